@@ -1,0 +1,41 @@
+#pragma once
+
+#include "Export.h"
+
+#include <memory>
+#include <ostream>
+#include <string>
+
+namespace RZLog {
+
+/**
+ * An output buffer in which one message after another is put together. It belongs to one thread.
+ */
+class KO_EXPORT RZMessageBuffer {
+public:
+    RZMessageBuffer();
+    ~RZMessageBuffer();
+    RZMessageBuffer(const RZMessageBuffer&) = delete;
+    RZMessageBuffer& operator=(const RZMessageBuffer&) = delete;
+
+    /** Appends text (null appends nothing). @return the stream view, for inserting more */
+    std::ostream& operator<<(const char* text);
+
+    /** The stream view, for inserting values of any type; lives as long as the buffer. */
+    operator std::ostream&();
+
+    /** @name Taking the message
+     * Gives the text accumulated since the last taking and leaves the buffer empty, ready for the
+     * next message. The argument is this buffer, or the stream that its operator<< returned.
+     */
+    ///@{
+    std::string str(RZMessageBuffer& buffer);
+    std::string str(std::ostream& stream);
+    ///@}
+
+private:
+    struct Implementation;
+    std::unique_ptr<Implementation> implementation;
+};
+
+}  // namespace RZLog
