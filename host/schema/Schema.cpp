@@ -1,0 +1,191 @@
+#include "schema/Schema.h"
+
+#include <algorithm>
+#include <stdexcept>
+
+#include "schema/CimType.h"
+#include "schema/StandardQualifiers.h"
+
+namespace cimhost {
+namespace {
+
+template <typename Element>
+const Element* findNamed(const std::vector<Element>& elements, std::string_view name) {
+    const auto found = std::find_if(elements.begin(), elements.end(),
+                                    [&](const Element& element) { return sameName(element.name, name); });
+    return found == elements.end() ? nullptr : &*found;
+}
+
+bool isTrue(const Qualifier* qualifier) {
+    if (qualifier == nullptr || qualifier->value.isNull) {
+        return false;
+    }
+    const bool* value = std::get_if<bool>(&qualifier->value.elements.front());
+    return value != nullptr && *value;
+}
+
+void inheritQualifiers(std::vector<Qualifier>& own, const std::vector<Qualifier>& inherited) {
+    for (const Qualifier& qualifier : inherited) {
+        if (qualifier.flavor.toSubclass && findNamed(own, qualifier.name) == nullptr) {
+            own.push_back(qualifier);
+        }
+    }
+}
+
+std::string typeText(const Property& property) {
+    return (property.type == CMPI_ref ? property.referenceClass + " REF" : std::string(typeName(property.type))) +
+           (property.isArray ? "[]" : "");
+}
+
+void checkOverride(const Class& declared, const Property& own, const Property& inherited) {
+    if (own.type != inherited.type || own.isArray != inherited.isArray) {
+        throw std::invalid_argument("property " + declared.name + "." + own.name + " is " + typeText(own) + ", but " +
+                                    inherited.origin + " declares it as " + typeText(inherited));
+    }
+}
+
+template <typename Element>
+void checkUnique(const Class& declared, const std::vector<Element>& elements, const char* kind) {
+    for (std::size_t i = 0; i < elements.size(); ++i) {
+        for (std::size_t j = 0; j < i; ++j) {
+            if (sameName(elements[i].name, elements[j].name)) {
+                throw std::invalid_argument("class " + declared.name + " declares the " + kind + " " +
+                                            elements[i].name + " twice");
+            }
+        }
+    }
+}
+
+/** The superclass's properties with the overriding ones in their places, then the class's further ones. */
+std::vector<Property> mergeProperties(const Class& declared, const Class& super) {
+    std::vector<Property> merged = super.properties;
+    for (const Property& own : declared.properties) {
+        const auto inherited = std::find_if(merged.begin(), merged.end(),
+                                            [&](const Property& each) { return sameName(each.name, own.name); });
+        if (inherited == merged.end()) {
+            merged.push_back(own);
+            continue;
+        }
+        checkOverride(declared, own, *inherited);
+        Property overriding = own;
+        inheritQualifiers(overriding.qualifiers, inherited->qualifiers);
+        *inherited = std::move(overriding);
+    }
+    return merged;
+}
+
+std::vector<Method> mergeMethods(const Class& declared, const Class& super) {
+    std::vector<Method> merged = declared.methods;
+    for (const Method& inherited : super.methods) {
+        if (findNamed(merged, inherited.name) == nullptr) {
+            merged.push_back(inherited);
+        }
+    }
+    return merged;
+}
+
+}  // namespace
+
+const Qualifier* Property::findQualifier(std::string_view qualifier) const {
+    return findNamed(qualifiers, qualifier);
+}
+
+bool Property::isKey() const {
+    return isTrue(findQualifier("Key"));
+}
+
+const Property* Class::findProperty(std::string_view property) const {
+    return findNamed(properties, property);
+}
+
+const Qualifier* Class::findQualifier(std::string_view qualifier) const {
+    return findNamed(qualifiers, qualifier);
+}
+
+std::vector<const Property*> Class::keys() const {
+    std::vector<const Property*> found;
+    for (const Property& property : properties) {
+        if (property.isKey()) {
+            found.push_back(&property);
+        }
+    }
+    return found;
+}
+
+bool Class::isAssociation() const {
+    return isTrue(findQualifier("Association"));
+}
+
+Schema::Schema() {
+    for (QualifierDeclaration& declaration : standardQualifiers()) {
+        qualifierDeclarations.emplace(declaration.name, declaration);
+    }
+}
+
+const Class* Schema::findClass(std::string_view name) const {
+    const auto found = byName.find(name);
+    return found == byName.end() ? nullptr : found->second.get();
+}
+
+std::vector<const Class*> Schema::classes() const {
+    return inOrder;
+}
+
+bool Schema::isA(std::string_view name, std::string_view ancestor) const {
+    if (sameName(name, ancestor)) {
+        return true;
+    }
+    const Class* known = findClass(name);
+    return known != nullptr && !known->superclass.empty() && isA(known->superclass, ancestor);
+}
+
+std::vector<const Class*> Schema::subclasses(std::string_view name) const {
+    std::vector<const Class*> found;
+    std::copy_if(inOrder.begin(), inOrder.end(), std::back_inserter(found),
+                 [&](const Class* each) { return !sameName(each->name, name) && isA(each->name, name); });
+    return found;
+}
+
+const Class& Schema::add(Class declared) {
+    if (findClass(declared.name) != nullptr) {
+        throw std::invalid_argument("class " + declared.name + " is declared a second time");
+    }
+    checkUnique(declared, declared.properties, "property");
+    for (Property& property : declared.properties) {
+        property.origin = declared.name;
+    }
+    for (Method& method : declared.methods) {
+        method.origin = declared.name;
+    }
+    if (!declared.superclass.empty()) {
+        const Class* super = findClass(declared.superclass);
+        if (super == nullptr) {
+            throw std::invalid_argument("superclass " + declared.superclass + " of class " + declared.name +
+                                        " is not declared; declare or include it first");
+        }
+        declared.superclass = super->name;
+        inheritQualifiers(declared.qualifiers, super->qualifiers);
+        declared.properties = mergeProperties(declared, *super);
+        declared.methods = mergeMethods(declared, *super);
+    }
+    const std::string name = declared.name;
+    const auto added = byName.emplace(name, std::make_unique<const Class>(std::move(declared))).first;
+    inOrder.push_back(added->second.get());
+    return *added->second;
+}
+
+const QualifierDeclaration* Schema::findQualifier(std::string_view name) const {
+    const auto found = qualifierDeclarations.find(name);
+    return found == qualifierDeclarations.end() ? nullptr : &found->second;
+}
+
+void Schema::add(QualifierDeclaration declaration) {
+    const QualifierDeclaration* known = findQualifier(declaration.name);
+    if (known != nullptr && !known->standard) {
+        throw std::invalid_argument("qualifier " + declaration.name + " is declared a second time");
+    }
+    const std::string name = declaration.name;
+    qualifierDeclarations.insert_or_assign(name, std::move(declaration));
+}
+
+}  // namespace cimhost
