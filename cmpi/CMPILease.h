@@ -1,0 +1,31 @@
+#pragma once
+
+#include "Lease.h"
+#include "PropertyTable.h"
+#include "RecordAdapter.h"
+
+#include <array>
+
+namespace KO::LeaseWarrantyProvider {
+
+/** The CIM class VELKO_Lease: what the design shared with VELKO_Warranty needs to know of it. */
+struct LeaseClass {
+    using Element = Lease;
+    static constexpr const char* className = "VELKO_Lease";
+    static constexpr const char* constructor = "CMPILease";
+    static constexpr const char* destructor = "~CMPILease";
+    static constexpr bool tracesCreation = true;
+    static constexpr const char* modifyPropertiesLabel = " properties";
+
+    static const TraceUnit& unit();
+    static const std::array<PropertyRow<Lease>, 18>& properties();
+    static bool create(Lease& lease, const std::string& instanceId) { return lease.createLease(instanceId); }
+    static void remove(Lease& lease) { lease.removeLease(); }
+};
+
+/** The adapter of VELKO_Lease. */
+using CMPILease = RecordAdapter<LeaseClass>;
+
+extern template class RecordAdapter<LeaseClass>;
+
+}  // namespace KO::LeaseWarrantyProvider

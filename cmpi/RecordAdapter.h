@@ -1,0 +1,70 @@
+#pragma once
+
+#include <cmpidt.h>
+
+#include <string>
+
+namespace KO::LeaseWarrantyProvider {
+
+/**
+ * The adapter of a CIM class whose instances are records with the one key "InstanceID": the design
+ * that CMPILease and CMPIWarranty share. It stands where its element stands.
+ *
+ * Policy gives:
+ *   Element                      the managed element
+ *   className                    the CIM class
+ *   constructor, destructor      their names in the log
+ *   tracesCreation               whether a creation's result is traced
+ *   modifyPropertiesLabel        label of the property list in the trace of a modification
+ *   unit(), properties()         trace unit and table of PropertyRow of the class
+ *   create(element, id), remove(element)   the element's operations
+ */
+template <class Policy>
+class RecordAdapter {
+public:
+    /** For creation: all records, no filter. */
+    RecordAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext, std::string requestNameSpace);
+
+    /** For every other request: the record that the path's key names, or all if it has no key. */
+    RecordAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext, const CMPIObjectPath* path);
+
+    /** Writes the data file back if anything changed; that may throw. */
+    ~RecordAdapter() noexcept(false);
+    RecordAdapter(const RecordAdapter&) = delete;
+    RecordAdapter& operator=(const RecordAdapter&) = delete;
+
+    /** Whether the adapter stands on a record. */
+    operator bool();
+
+    /** Moves to the next record that the path selects. */
+    void operator++();
+
+    /** Narrows the element to the record that the path's key names. A key that cannot be read selects nothing. */
+    void setObjectPath(const CMPIObjectPath* path);
+
+    /** Path of the current record; without key when the adapter stands on none, null when it cannot be made. */
+    CMPIObjectPath* getObjectPath();
+
+    /** Instance of the current record with every property that is present; null when it cannot be made. */
+    CMPIInstance* getCMPIInstance(const char** properties);
+
+    /**
+     * Makes a record with the path's key and default values, and stands on it.
+     * @return its instance; null when the path has no key and nothing was made
+     */
+    CMPIInstance* createCMPIInstance(const CMPIObjectPath* desiredObjectPath);
+
+    /** Writes the instance's modifiable properties into the current record; a null instance changes nothing. */
+    void modifyCMPIInstance(const CMPIInstance* referenceInstance, const char** properties);
+
+    /** Removes the current record. */
+    void deleteCMPIInstance();
+
+private:
+    const CMPIBroker* broker;
+    const CMPIContext* context;
+    std::string nameSpace;
+    typename Policy::Element element{};
+};
+
+}  // namespace KO::LeaseWarrantyProvider

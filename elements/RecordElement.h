@@ -1,0 +1,88 @@
+#pragma once
+
+#include "Trace.h"
+
+#include <string>
+#include <vector>
+
+namespace KO::LeaseWarrantyProvider {
+
+/** What differs in the wording of two record elements. */
+struct RecordElementTexts {
+    const char* elementName;        ///< value of the ElementName property
+    const char* removeUnfiltered;   ///< thrown when a record is to be removed and none was identified
+    const char* identifierMissing;  ///< thrown when the current record gives no identifier
+};
+
+/**
+ * An element over a record store: it walks the records in table order, narrowed by filters, and
+ * gives access to the current one. The design that Lease and Warranty share.
+ *
+ * It stands on the first record when made; filters count from setFilter and operator++ on.
+ *
+ * Policy gives:
+ *   Base, Property     the record cursor and its property numbers
+ *   identifier         the number of the identifier property
+ *   unit(), texts()    trace unit and RecordElementTexts of the element
+ */
+template <class Policy>
+class RecordElement {
+public:
+    /** What a filter compares. Values without a name are kept and match every record. */
+    enum FilterType : int {
+        InstanceIDFilter = 0,  ///< the identifier, byte for byte
+    };
+
+    /** A condition on records. */
+    struct Filter {
+        FilterType type;
+        std::string reference;  ///< the value that the record must have
+    };
+
+    /** Whether the element stands on a record. */
+    operator bool();
+
+    /** Moves to the next record that passes the filters, or to the end. */
+    void operator++();
+
+    /** Adds a filter and moves forward, from the current record on, to the first that passes all. */
+    void setFilter(FilterType type, std::string reference);
+
+    /** Whether the current record passes all filters. Throws InstrumentationException when none is current. */
+    bool evaluate() const;
+
+    /** @name Properties that every record has alike
+     * A getter that answers false leaves its argument untouched: the property is to stay unset.
+     */
+    ///@{
+    bool getElementName(std::string& value) const;
+    bool getCaption(std::string& value) const;
+    bool getDescription(std::string& value) const;
+    bool getConfigurationName(std::string& value) const;
+    bool getChangeableType(unsigned short& value) const;
+    ///@}
+
+    /** The current record's identifier. Throws InstrumentationException when no record is current. */
+    bool getInstanceID(std::string& value) const;
+
+protected:
+    using Property = typename Policy::Property;
+
+    RecordElement() = default;
+    ~RecordElement() noexcept(false) = default;
+
+    /** Throws unless a filter identified what is to be removed. */
+    void requireFilter(const CallSite& site) const;
+
+    /** Reads or writes a property of the current record under the name of the calling operation. */
+    template <class Value>
+    bool get(const CallSite& site, Property property, Value& value) const;
+    template <class Value>
+    void set(const CallSite& site, Property property, const Value& value);
+
+    bool filterSet = false;
+    std::vector<Filter> filters{};
+    typename Policy::Base base{};
+};
+
+}  // namespace KO::LeaseWarrantyProvider

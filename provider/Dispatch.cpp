@@ -1,0 +1,43 @@
+#include "Dispatch.h"
+
+#include "Bodies.h"
+#include "CMPILease.h"
+
+#include <algorithm>
+#include <array>
+
+namespace KO::LeaseWarrantyProvider {
+
+namespace {
+
+struct DispatchRow {
+    unsigned short classId;
+    std::array<Body, static_cast<std::size_t>(Operation::count)> bodies;
+};
+
+using namespace Bodies;
+
+constexpr Body none = &invalidClass;
+
+/**
+ * Class id, then the bodies in the order of Operation. An association class is enumerated but, as
+ * designed, cannot be got.
+ */
+constexpr std::array<DispatchRow, 3> dispatchTable{{
+    // clang-format off
+    {20,  {&names<CMPILease>, &instances<CMPILease>, &instances<CMPILease>,
+           &create<CMPILease>, &modify<CMPILease>, &remove<CMPILease>, none, none}},
+    {25,  {none, none, &notSupported, none, none, none, none, none}},
+    {32,  {none, none, &notSupported, none, none, none, none, none}},
+    // clang-format on
+}};
+
+}  // namespace
+
+Body bodyOf(Operation operation, unsigned short classId) {
+    const auto served = [&](const DispatchRow& row) { return row.classId == classId; };
+    const auto row = std::find_if(dispatchTable.begin(), dispatchTable.end(), served);
+    return row == dispatchTable.end() ? none : row->bodies[static_cast<std::size_t>(operation)];
+}
+
+}  // namespace KO::LeaseWarrantyProvider

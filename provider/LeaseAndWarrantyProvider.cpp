@@ -1,0 +1,211 @@
+#include "LeaseAndWarrantyProvider.h"
+
+#include "Dispatch.h"
+#include "KO/ProviderUtilities.h"
+#include "LoggerNames.h"
+#include "Trace.h"
+
+#include <exception>
+#include <string>
+
+namespace KO::LeaseWarrantyProvider {
+
+std::string loggerLeaseAndWarrantyProvider(LoggerNames::provider);
+
+/** The broker of the latest factory call. */
+const CMPIBroker* broker = nullptr;
+
+namespace {
+
+const TraceUnit unit{loggerLeaseAndWarrantyProvider, "LeaseAndWarrantyProvider.cpp"};
+
+/** Stands at the head of every dispatched entry point: marks its entry and, when it answers, its exit. */
+class EntryMarkers {
+public:
+    explicit EntryMarkers(const CallSite& callSite) : site(callSite), exceptions(std::uncaught_exceptions()) {
+        markProviderEntry(site.unit->logger, site.function, site.unit->file, site.line);
+    }
+
+    ~EntryMarkers() {
+        if (std::uncaught_exceptions() == exceptions) {
+            markProviderExit(site.unit->logger, site.function, site.unit->file, site.line);
+        }
+    }
+
+    EntryMarkers(const EntryMarkers&) = delete;
+    EntryMarkers& operator=(const EntryMarkers&) = delete;
+
+private:
+    CallSite site;
+    int exceptions;
+};
+
+/** The class id of a request's path or association class, as the log shows it. */
+template <class Class>
+unsigned short classIdOf(const CallSite& site, Class requestedClass) {
+    const unsigned short classId = ProviderUtilities::getClassId(requestedClass);
+    traceVariable(site, "classId", classId);
+    return classId;
+}
+
+/**
+ * Runs an operation's body for a class. What it throws is only logged: the object manager sees a
+ * success with whatever was returned before. Exceptions of other kinds leave the provider.
+ */
+CMPIStatus serve(const CallSite& site, Operation operation, unsigned short classId, Request& request) {
+    try {
+        bodyOf(operation, classId)(request);
+    } catch (const std::exception& failure) {
+        traceMessage({site.unit, Level::error, site.function, site.line}, failure.what());
+    }
+    return request.status;
+}
+
+/** The answer of an operation that is only noted. */
+CMPIStatus note(const CallSite& site, CMPIrc rc) {
+    traceMethod(site);
+    return {rc, nullptr};
+}
+
+/**
+ * The namespace in which a new instance is named. The status that the request will answer is
+ * written by the two calls and stays as they left it.
+ */
+std::string nameSpaceOf(const CMPIObjectPath* ref, CMPIStatus& status) {
+    if (ref == nullptr) {
+        return {};
+    }
+    const CMPIString* text = ref->ft->getNameSpace(ref, &status);
+    if (status.rc != CMPI_RC_OK || text == nullptr) {
+        return {};
+    }
+    const char* characters = text->ft->getCharPtr(text, &status);
+    return status.rc == CMPI_RC_OK && characters != nullptr ? characters : "";
+}
+
+CMPIStatus LeaseAndWarranty_Cleanup(CMPIInstanceMI*, const CMPIContext*, CMPIBoolean) {
+    return note(at(unit), CMPI_RC_OK);
+}
+
+CMPIStatus LeaseAndWarranty_EnumInstanceNames(CMPIInstanceMI*, const CMPIContext* ctx, const CMPIResult* result,
+                                              const CMPIObjectPath* ref) {
+    const EntryMarkers markers(at(unit));
+    Request request{broker, ctx, result, ref};
+    return serve(at(unit), Operation::enumInstanceNames, classIdOf(at(unit), ref), request);
+}
+
+CMPIStatus LeaseAndWarranty_EnumInstances(CMPIInstanceMI*, const CMPIContext* ctx, const CMPIResult* result,
+                                          const CMPIObjectPath* ref, const char** properties) {
+    const EntryMarkers markers(at(unit));
+    Request request{broker, ctx, result, ref, properties};
+    return serve(at(unit), Operation::enumInstances, classIdOf(at(unit), ref), request);
+}
+
+CMPIStatus LeaseAndWarranty_GetInstance(CMPIInstanceMI*, const CMPIContext* ctx, const CMPIResult* result,
+                                        const CMPIObjectPath* ref, const char** properties) {
+    const EntryMarkers markers(at(unit));
+    Request request{broker, ctx, result, ref, properties};
+    return serve(at(unit), Operation::getInstance, classIdOf(at(unit), ref), request);
+}
+
+CMPIStatus LeaseAndWarranty_CreateInstance(CMPIInstanceMI*, const CMPIContext* ctx, const CMPIResult* result,
+                                           const CMPIObjectPath* ref, const CMPIInstance*) {
+    const EntryMarkers markers(at(unit));
+    const unsigned short classId = classIdOf(at(unit), ref);
+    Request request{broker, ctx, result, ref};
+    request.nameSpace = nameSpaceOf(ref, request.status);
+    return serve(at(unit), Operation::createInstance, classId, request);
+}
+
+CMPIStatus LeaseAndWarranty_ModifyInstance(CMPIInstanceMI*, const CMPIContext* ctx, const CMPIResult* result,
+                                           const CMPIObjectPath* ref, const CMPIInstance* inst,
+                                           const char** properties) {
+    const EntryMarkers markers(at(unit));
+    Request request{broker, ctx, result, ref, properties, inst};
+    return serve(at(unit), Operation::modifyInstance, classIdOf(at(unit), ref), request);
+}
+
+CMPIStatus LeaseAndWarranty_DeleteInstance(CMPIInstanceMI*, const CMPIContext* ctx, const CMPIResult* result,
+                                           const CMPIObjectPath* ref) {
+    const EntryMarkers markers(at(unit));
+    Request request{broker, ctx, result, ref};
+    return serve(at(unit), Operation::deleteInstance, classIdOf(at(unit), ref), request);
+}
+
+CMPIStatus LeaseAndWarranty_ExecQuery(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*,
+                                      const char*, const char*) {
+    return note(at(unit), CMPI_RC_ERR_NOT_SUPPORTED);
+}
+
+CMPIStatus LeaseAndWarranty_AssociationCleanup(CMPIAssociationMI*, const CMPIContext*, CMPIBoolean) {
+    return note(at(unit), CMPI_RC_OK);
+}
+
+CMPIStatus LeaseAndWarranty_Associators(CMPIAssociationMI*, const CMPIContext* ctx, const CMPIResult* result,
+                                        const CMPIObjectPath* ref, const char* assocClass, const char*, const char*,
+                                        const char*, const char** properties) {
+    const EntryMarkers markers(at(unit));
+    Request request{broker, ctx, result, ref, properties};
+    return serve(at(unit), Operation::associators, classIdOf(at(unit), assocClass), request);
+}
+
+CMPIStatus LeaseAndWarranty_AssociatorNames(CMPIAssociationMI*, const CMPIContext* ctx, const CMPIResult* result,
+                                            const CMPIObjectPath* ref, const char* assocClass, const char*, const char*,
+                                            const char*) {
+    const EntryMarkers markers(at(unit));
+    Request request{broker, ctx, result, ref};
+    return serve(at(unit), Operation::associatorNames, classIdOf(at(unit), assocClass), request);
+}
+
+CMPIStatus LeaseAndWarranty_References(CMPIAssociationMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*,
+                                       const char*, const char*, const char**) {
+    return note(at(unit), CMPI_RC_ERR_NOT_SUPPORTED);
+}
+
+CMPIStatus LeaseAndWarranty_ReferenceNames(CMPIAssociationMI*, const CMPIContext*, const CMPIResult*,
+                                           const CMPIObjectPath*, const char*, const char*) {
+    return note(at(unit), CMPI_RC_ERR_NOT_SUPPORTED);
+}
+
+CMPIInstanceMIFT instMIFT__{
+    CMPIVersion200,
+    CMPIVersion200,
+    "instanceLeaseAndWarrantyProvider",
+    LeaseAndWarranty_Cleanup,
+    LeaseAndWarranty_EnumInstanceNames,
+    LeaseAndWarranty_EnumInstances,
+    LeaseAndWarranty_GetInstance,
+    LeaseAndWarranty_CreateInstance,
+    LeaseAndWarranty_ModifyInstance,
+    LeaseAndWarranty_DeleteInstance,
+    LeaseAndWarranty_ExecQuery,
+};
+
+CMPIAssociationMIFT assocMIFT__{
+    CMPIVersion200,
+    CMPIVersion200,
+    "associationLeaseAndWarrantyProvider",
+    LeaseAndWarranty_AssociationCleanup,
+    LeaseAndWarranty_Associators,
+    LeaseAndWarranty_AssociatorNames,
+    LeaseAndWarranty_References,
+    LeaseAndWarranty_ReferenceNames,
+};
+
+CMPIInstanceMI instanceMI{nullptr, &instMIFT__};
+CMPIAssociationMI associationMI{nullptr, &assocMIFT__};
+
+}  // namespace
+
+}  // namespace KO::LeaseWarrantyProvider
+
+CMPIInstanceMI* LeaseAndWarrantyProvider_Create_InstanceMI(const CMPIBroker* broker, const CMPIContext*, CMPIStatus*) {
+    KO::LeaseWarrantyProvider::broker = broker;
+    return &KO::LeaseWarrantyProvider::instanceMI;
+}
+
+CMPIAssociationMI* LeaseAndWarrantyProvider_Create_AssociationMI(const CMPIBroker* broker, const CMPIContext*,
+                                                                 CMPIStatus*) {
+    KO::LeaseWarrantyProvider::broker = broker;
+    return &KO::LeaseWarrantyProvider::associationMI;
+}

@@ -1,0 +1,42 @@
+#pragma once
+
+#include "RecordTrace.h"
+
+#include <fstream>
+#include <string>
+
+namespace KO::LeaseWarrantyProvider {
+
+struct LeaseStore;
+
+/**
+ * The terms of one lease. Money amounts are text, exactly as the client gave them; nothing here
+ * interprets them.
+ */
+struct LeaseUnit : private RecordTrace<LeaseStore> {
+    LeaseUnit() = default;
+    explicit LeaseUnit(const std::string& instanceId) : RecordTrace(instanceId), InstanceID(instanceId) {}
+
+    bool inUse = true;  ///< false once deleted: the record stays in the table and is passed over
+    bool EarlyTerminationOption = false;
+    bool FixedPricePurchaseOption = false;
+    bool RenewalOption = false;
+    bool BargainRenewalOption = false;
+    unsigned int LeaseTerm = 0;
+    unsigned int NetMonthlyLeaseRateFactor = 0;
+    std::string InstanceID;  ///< the key, unique among the records in use
+    std::string Lessor;
+    std::string BaseRent;
+    std::string BaseTermCommencementDate;  ///< CIM datetime text
+    std::string FairMarketRental;
+    std::string FairMarketValue;
+    std::string TerminationValue;
+};
+
+/** Reads one record of a lease file from where the stream stands. A field that cannot be read keeps its value. */
+std::ifstream& operator>>(std::ifstream& source, LeaseUnit& lease);
+
+/** Writes one record of a lease file: thirteen lines, each flushed. */
+std::ofstream& operator<<(std::ofstream& target, const LeaseUnit& lease);
+
+}  // namespace KO::LeaseWarrantyProvider

@@ -1,0 +1,217 @@
+#pragma once
+
+// Definitions of RecordBase. Included by the source file of each store and nowhere else, so that each
+// store's code and trace buffers stand in its own unit.
+
+#include "Exceptions.h"
+#include "RecordBase.h"
+#include "RecordTable.h"
+#include "RecordTrace.h"
+
+#include <algorithm>
+#include <exception>
+#include <utility>
+
+namespace KO::LeaseWarrantyProvider {
+
+namespace {
+constexpr const char* wrongTypeOrProperty = "Incorrect Type or Property";
+constexpr const char* wrongTypeOrPropertyOfNumber = "Incorrect Type or Property.";
+constexpr const char* wrongTypeOrReadOnly = "Incorrect Type or Property or Property is read-Only.";
+}  // namespace
+
+template <class Unit>
+void loadStore(const RecordStoreTexts& texts, unsigned int& count, std::vector<Unit>& table) noexcept {
+    try {
+        loadRecords(dataFilePath(texts.fileName), count, table);
+    } catch (const std::exception&) {
+        count = 0;
+        table.clear();
+    }
+}
+
+template <class Unit>
+void flushStore(const CallSite& site, const RecordStoreTexts& texts, unsigned int count,
+                const std::vector<Unit>& table) {
+    traceVariable(site, texts.countName, count);
+    if (!writeRecords(dataFilePath(texts.fileName), count, table)) {
+        fail<InstrumentationException>(site, texts.fileCannotBeOpened);
+    }
+}
+
+template <class Policy>
+RecordTrace<Policy>::RecordTrace() {
+    const Traced traced(at(Policy::unit(), Level::flow, Policy::unitName));
+}
+
+template <class Policy>
+RecordTrace<Policy>::RecordTrace(const std::string& instanceId) {
+    const Traced traced(at(Policy::unit(), Level::flow, Policy::unitName), label::instanceId, instanceId);
+}
+
+template <class Policy>
+RecordTrace<Policy>::RecordTrace(const RecordTrace& instance) {
+    const Traced traced(at(Policy::unit(), Level::flow, Policy::unitName), label::instance, &instance);
+}
+
+template <class Policy>
+RecordTrace<Policy>& RecordTrace<Policy>::operator=(const RecordTrace& instance) {
+    const Traced traced(at(Policy::unit()), label::instance, &instance);
+    return *this;
+}
+
+template <class Policy>
+void RecordBase<Policy>::skipTo(std::size_t index) {
+    const auto& table = Policy::table();
+    const auto inUse = [](const Unit& unit) { return unit.inUse; };
+    const auto from = table.begin() + static_cast<std::ptrdiff_t>(std::min(index, table.size()));
+    const auto found = std::find_if(from, table.end(), inUse);
+    cursor = found == table.end() ? end : static_cast<std::size_t>(found - table.begin());
+}
+
+template <class Policy>
+void RecordBase<Policy>::positionFirst() {
+    traceVariable(at(Policy::unit()), Policy::texts().countName, Policy::count());
+    if (Policy::count() == 0) {
+        cursor = end;
+        return;
+    }
+    skipTo(0);
+    if (cursor == end) {
+        fail<InstrumentationException>(at(Policy::unit()), Policy::texts().noRecords);
+    }
+}
+
+template <class Policy>
+void RecordBase<Policy>::rewriteIfModified() {
+    traceVariable(at(Policy::unit()), "cacheModified", cacheModified ? 1U : 0U);
+    if (!cacheModified) {
+        return;
+    }
+    try {
+        Policy::cache().flushCache();
+        cacheModified = false;
+    } catch (const std::exception& failure) {
+        if (std::uncaught_exceptions() == 0) {
+            throw;
+        }
+        traceMessage(at(Policy::unit(), Level::error), failure.what());
+    }
+}
+
+template <class Policy>
+RecordBase<Policy>::operator bool() {
+    const Traced traced(at(Policy::unit()));
+    if (cursor != end) {
+        skipTo(cursor);
+    }
+    return cursor != end;
+}
+
+template <class Policy>
+void RecordBase<Policy>::operator++() {
+    const Traced traced(at(Policy::unit()));
+    if (cursor != end) {
+        skipTo(cursor + 1);
+    }
+}
+
+template <class Policy>
+void RecordBase<Policy>::select(const std::string& instanceId) {
+    const auto& table = Policy::table();
+    while (cursor != end && !(table[cursor].inUse && table[cursor].InstanceID == instanceId)) {
+        skipTo(cursor + 1);
+    }
+}
+
+template <class Policy>
+bool RecordBase<Policy>::create(const std::string& instanceId) {
+    auto& table = Policy::table();
+    const auto taken = [&](const Unit& unit) { return unit.inUse && unit.InstanceID == instanceId; };
+    if (std::any_of(table.begin(), table.end(), taken)) {
+        fail<InstrumentationException>(at(Policy::unit()), Policy::texts().identifierExists);
+    }
+    const bool stoodOnEntry = cursor != end;
+    table.push_back(Unit(instanceId));
+    ++Policy::count();
+    cacheModified = true;
+    cursor = 0;
+    return stoodOnEntry;
+}
+
+template <class Policy>
+void RecordBase<Policy>::remove() {
+    requireCurrent(at(Policy::unit()));
+    Policy::table()[cursor].inUse = false;
+    --Policy::count();
+    traceVariable(at(Policy::unit()), Policy::texts().countName, Policy::count());
+    cacheModified = true;
+}
+
+template <class Policy>
+void RecordBase<Policy>::requireCurrent(const CallSite& site) const {
+    if (cursor == end) {
+        fail<InstrumentationException>(site, Policy::texts().notAvailable);
+    }
+}
+
+/** The member behind a property, null when the property is of another type or, for writing, read-only. */
+template <class Policy>
+template <class Value>
+Value RecordBase<Policy>::Unit::*RecordBase<Policy>::memberOf(Property property, bool forWriting) {
+    for (const auto& field : Policy::fields()) {
+        if (field.property == property) {
+            const auto* member = std::get_if<Value Unit::*>(&field.member);
+            return member != nullptr && (!forWriting || writable(field)) ? *member : nullptr;
+        }
+    }
+    return nullptr;
+}
+
+template <class Policy>
+template <class Value>
+bool RecordBase<Policy>::get(const CallSite& site, Property property, Value& value) const {
+    const Traced traced(site, label::property, property, label::value, value);
+    requireCurrent(site);
+    const auto member = memberOf<Value>(property, false);
+    if (member == nullptr) {
+        fail<InstrumentationException>(site, wrongTypeOrProperty);
+    }
+    value = Policy::table()[cursor].*member;
+    return true;
+}
+
+template <class Policy>
+template <class Value>
+void RecordBase<Policy>::set(const CallSite& site, Property property, const Value& value, const char* wrongType) {
+    const Traced traced(site, label::property, property, label::value, value);
+    requireCurrent(site);
+    const auto member = memberOf<Value>(property, true);
+    if (member == nullptr) {
+        fail<InstrumentationException>(site, wrongType);
+    }
+    Policy::table()[cursor].*member = value;
+    cacheModified = true;
+}
+
+template <class Policy>
+bool RecordBase<Policy>::getProperty(Property property, std::string& value) const {
+    return get(at(Policy::unit()), property, value);
+}
+
+template <class Policy>
+bool RecordBase<Policy>::getProperty(Property property, unsigned int& value) const {
+    return get(at(Policy::unit()), property, value);
+}
+
+template <class Policy>
+void RecordBase<Policy>::setProperty(Property property, std::string value) {
+    set(at(Policy::unit()), property, value, wrongTypeOrReadOnly);
+}
+
+template <class Policy>
+void RecordBase<Policy>::setProperty(Property property, unsigned int value) {
+    set(at(Policy::unit()), property, value, wrongTypeOrPropertyOfNumber);
+}
+
+}  // namespace KO::LeaseWarrantyProvider

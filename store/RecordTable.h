@@ -1,0 +1,86 @@
+#pragma once
+
+#include "RecordStream.h"
+
+#include <cstddef>
+#include <fstream>
+#include <locale>
+#include <string>
+#include <vector>
+
+namespace KO::LeaseWarrantyProvider {
+
+/** Room made for records before any is known. */
+constexpr std::size_t reservedRecords = 10;
+
+/** Whether this machine's memory could hold so many bytes at all. */
+bool memoryCanHold(std::size_t count, std::size_t size);
+
+/** The path of a file of the agent's data directory. */
+std::string dataFilePath(const char* fileName);
+
+/**
+ * Opens a record file in the classic locale: the process's own locale may group digits.
+ * @return the stream, good or not
+ */
+template <class Stream>
+Stream openRecordFile(const std::string& path, std::ios::openmode mode) {
+    Stream stream(path, mode);
+    stream.imbue(std::locale::classic());
+    return stream;
+}
+
+/**
+ * Reads a record file into an empty table.
+ *
+ * The count at the head is believed: a shorter file yields the declared number of records, a missing
+ * field keeping the value of the record before. Only a count that memory cannot hold, or that is no
+ * number, makes the file unreadable.
+ *
+ * @param count receives the number of records; 0, with an empty table, for an unreadable file
+ */
+template <class Unit>
+void loadRecords(const std::string& path, unsigned int& count, std::vector<Unit>& table) {
+    table.reserve(reservedRecords);
+    auto stream = openRecordFile<std::ifstream>(path, std::ios::in);
+    if (!stream.good()) {
+        return;
+    }
+    unsigned int declared = 0;
+    extract(stream, declared);
+    const std::size_t room = std::size_t{2} * declared;
+    if (declared > reservedRecords) {
+        if (!memoryCanHold(room, sizeof(Unit))) {
+            return;
+        }
+        table.reserve(room);
+    }
+    Unit scratch;
+    for (unsigned int record = 0; record < declared; ++record) {
+        stream >> scratch;
+        table.push_back(scratch);
+    }
+    count = declared;
+}
+
+/**
+ * Rewrites a record file in place: the count, then each record in use.
+ * @return false when the file cannot be opened for writing
+ */
+template <class Unit>
+bool writeRecords(const std::string& path, unsigned int count, const std::vector<Unit>& table) {
+    auto stream = openRecordFile<std::ofstream>(path, std::ios::out | std::ios::trunc);
+    if (!stream.good()) {
+        return false;
+    }
+    stream << count;
+    endLine(stream);
+    for (const Unit& unit : table) {
+        if (unit.inUse) {
+            stream << unit;
+        }
+    }
+    return true;
+}
+
+}  // namespace KO::LeaseWarrantyProvider

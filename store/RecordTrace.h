@@ -1,0 +1,26 @@
+#pragma once
+
+#include <string>
+
+namespace KO::LeaseWarrantyProvider {
+
+/**
+ * Traces the making and copying of records, as a base of each record type. It holds nothing; the
+ * record types keep the copying that the compiler writes. Moves, as a growing table makes them, are
+ * not traced.
+ *
+ * Policy gives unit(), the trace unit, and unitName, the record type's name.
+ */
+template <class Policy>
+class RecordTrace {
+public:
+    RecordTrace();
+    explicit RecordTrace(const std::string& instanceId);
+    RecordTrace(const RecordTrace& instance);
+    RecordTrace& operator=(const RecordTrace& instance);
+    RecordTrace(RecordTrace&&) noexcept = default;
+    RecordTrace& operator=(RecordTrace&&) noexcept = default;
+    ~RecordTrace() = default;
+};
+
+}  // namespace KO::LeaseWarrantyProvider
