@@ -7,14 +7,12 @@ namespace KO::LeaseWarrantyProvider {
 
 std::string loggerCMPILease(LoggerNames::provider);
 
-namespace {
-
-const TraceUnit unit{loggerCMPILease, "CMPILease.cpp"};
+const TraceUnit LeaseClass::unit{loggerCMPILease, "CMPILease.cpp"};
 
 using L = Lease;
 
 /** In the order in which an instance is filled. */
-constexpr std::array<PropertyRow<L>, 18> properties{{
+const std::array<PropertyRow<L>, 18> LeaseClass::properties{{
     property<L, &L::getCaption>("Caption"),
     property<L, &L::getDescription>("Description"),
     property<L, &L::getInstanceID>("InstanceID"),
@@ -34,16 +32,6 @@ constexpr std::array<PropertyRow<L>, 18> properties{{
     property<L, &L::getTerminationValue, &L::setTerminationValue>("TerminationValue"),
     property<L, &L::getNetMonthlyLeaseRateFactor, &L::setNetMonthlyLeaseRateFactor>("NetMonthlyLeaseRateFactor"),
 }};
-
-}  // namespace
-
-const TraceUnit& LeaseClass::unit() {
-    return LeaseWarrantyProvider::unit;
-}
-
-const std::array<PropertyRow<Lease>, 18>& LeaseClass::properties() {
-    return LeaseWarrantyProvider::properties;
-}
 
 template class RecordAdapter<LeaseClass>;
 

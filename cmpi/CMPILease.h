@@ -17,10 +17,8 @@ struct LeaseClass {
     static constexpr bool tracesCreation = true;
     static constexpr const char* modifyPropertiesLabel = " properties";
 
-    static const TraceUnit& unit();
-    static const std::array<PropertyRow<Lease>, 18>& properties();
-    static bool create(Lease& lease, const std::string& instanceId) { return lease.createLease(instanceId); }
-    static void remove(Lease& lease) { lease.removeLease(); }
+    static const TraceUnit unit;
+    static const std::array<PropertyRow<Lease>, 18> properties;
 };
 
 /** The adapter of VELKO_Lease. */

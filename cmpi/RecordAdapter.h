@@ -16,8 +16,7 @@ namespace KO::LeaseWarrantyProvider {
  *   constructor, destructor      their names in the log
  *   tracesCreation               whether a creation's result is traced
  *   modifyPropertiesLabel        label of the property list in the trace of a modification
- *   unit(), properties()         trace unit and table of PropertyRow of the class
- *   create(element, id), remove(element)   the element's operations
+ *   unit, properties             trace unit and table of PropertyRow of the class
  */
 template <class Policy>
 class RecordAdapter {

@@ -40,7 +40,7 @@ template <class Policy>
 RecordAdapter<Policy>::RecordAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext,
                                      std::string requestNameSpace)
     : broker(requestBroker), context(requestContext), nameSpace(std::move(requestNameSpace)) {
-    const Traced traced(at(Policy::unit(), Level::flow, Policy::constructor), label::broker, broker, label::context,
+    const Traced traced(at(Policy::unit, Level::flow, Policy::constructor), label::broker, broker, label::context,
                         context);
 }
 
@@ -48,31 +48,31 @@ template <class Policy>
 RecordAdapter<Policy>::RecordAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext,
                                      const CMPIObjectPath* path)
     : broker(requestBroker), context(requestContext), nameSpace(ProviderUtilities::getNamespace(path)) {
-    const Traced traced(at(Policy::unit(), Level::flow, Policy::constructor), label::broker, broker, label::context,
+    const Traced traced(at(Policy::unit, Level::flow, Policy::constructor), label::broker, broker, label::context,
                         context, label::objectPath, path);
     setObjectPath(path);
 }
 
 template <class Policy>
 RecordAdapter<Policy>::~RecordAdapter() noexcept(false) {
-    const Traced traced(at(Policy::unit(), Level::flow, Policy::destructor));
+    const Traced traced(at(Policy::unit, Level::flow, Policy::destructor));
 }
 
 template <class Policy>
 RecordAdapter<Policy>::operator bool() {
-    const Traced traced(at(Policy::unit()));
+    const Traced traced(at(Policy::unit));
     return element;
 }
 
 template <class Policy>
 void RecordAdapter<Policy>::operator++() {
-    const Traced traced(at(Policy::unit()));
+    const Traced traced(at(Policy::unit));
     ++element;
 }
 
 template <class Policy>
 void RecordAdapter<Policy>::setObjectPath(const CMPIObjectPath* path) {
-    const Traced traced(at(Policy::unit()), label::objectPath, path);
+    const Traced traced(at(Policy::unit), label::objectPath, path);
     if (ProviderUtilities::getKeyCount(path) == 0) {
         return;
     }
@@ -83,7 +83,7 @@ void RecordAdapter<Policy>::setObjectPath(const CMPIObjectPath* path) {
 
 template <class Policy>
 CMPIObjectPath* RecordAdapter<Policy>::getObjectPath() {
-    const Traced traced(at(Policy::unit()));
+    const Traced traced(at(Policy::unit));
     CMPIObjectPath* path = ProviderUtilities::createObjectPath(broker, Policy::className, nameSpace);
     std::string instanceId;
     if (path != nullptr && element && element.getInstanceID(instanceId)) {
@@ -94,10 +94,10 @@ CMPIObjectPath* RecordAdapter<Policy>::getObjectPath() {
 
 template <class Policy>
 CMPIInstance* RecordAdapter<Policy>::getCMPIInstance(const char** properties) {
-    const Traced traced(at(Policy::unit()), label::properties, properties);
+    const Traced traced(at(Policy::unit), label::properties, properties);
     CMPIInstance* instance = ProviderUtilities::createInstance(broker, getObjectPath());
     if (instance != nullptr) {
-        for (const auto& row : Policy::properties()) {
+        for (const auto& row : Policy::properties) {
             row.fill(element, broker, instance, row.name);
         }
     }
@@ -106,10 +106,10 @@ CMPIInstance* RecordAdapter<Policy>::getCMPIInstance(const char** properties) {
 
 template <class Policy>
 CMPIInstance* RecordAdapter<Policy>::createCMPIInstance(const CMPIObjectPath* desiredObjectPath) {
-    const Traced traced(at(Policy::unit()), label::desiredObjectPath, desiredObjectPath);
+    const Traced traced(at(Policy::unit), label::desiredObjectPath, desiredObjectPath);
     std::string instanceId;
     const bool found = ProviderUtilities::getKeyProperty(desiredObjectPath, instanceIdKey, instanceId);
-    traceVariable(at(Policy::unit()), "instanceId", instanceId);
+    traceVariable(at(Policy::unit), "instanceId", instanceId);
 
     // Asked for at each creation, although nothing in the record depends on it.
     const Instrumentation instrumentation;
@@ -118,9 +118,9 @@ CMPIInstance* RecordAdapter<Policy>::createCMPIInstance(const CMPIObjectPath* de
     if (!found) {
         return nullptr;
     }
-    const bool created = Policy::create(element, instanceId);
+    const bool created = element.create(instanceId);
     if constexpr (Policy::tracesCreation) {
-        traceVariable(at(Policy::unit()), "Instance Created", created ? 1U : 0U);
+        traceVariable(at(Policy::unit), "Instance Created", created ? 1U : 0U);
     }
     if (!created) {
         return nullptr;
@@ -131,12 +131,12 @@ CMPIInstance* RecordAdapter<Policy>::createCMPIInstance(const CMPIObjectPath* de
 
 template <class Policy>
 void RecordAdapter<Policy>::modifyCMPIInstance(const CMPIInstance* referenceInstance, const char** properties) {
-    const Traced traced(at(Policy::unit()), Policy::modifyPropertiesLabel, properties, label::referenceInstance,
+    const Traced traced(at(Policy::unit), Policy::modifyPropertiesLabel, properties, label::referenceInstance,
                         referenceInstance);
     if (referenceInstance == nullptr) {
         return;
     }
-    for (const auto& row : Policy::properties()) {
+    for (const auto& row : Policy::properties) {
         if (row.modify != nullptr) {
             row.modify(element, referenceInstance, row.name);
         }
@@ -146,9 +146,9 @@ void RecordAdapter<Policy>::modifyCMPIInstance(const CMPIInstance* referenceInst
 template <class Policy>
 void RecordAdapter<Policy>::deleteCMPIInstance() {
     CMPIInstance* instance = nullptr;
-    const Traced traced(at(Policy::unit()), label::instance, instance);
+    const Traced traced(at(Policy::unit), label::instance, instance);
     instance = getCMPIInstance(nullptr);
-    Policy::remove(element);
+    element.remove();
 }
 
 }  // namespace KO::LeaseWarrantyProvider

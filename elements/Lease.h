@@ -13,30 +13,20 @@ struct LeaseElement {
     using Property = Properties::Lease;
     static constexpr Property identifier = Property::InstanceID;
 
-    static const TraceUnit& unit();
-    static const RecordElementTexts& texts();
+    static const TraceUnit unit;
+    static const RecordElementTexts texts;
 };
 
 /**
- * The managed element of VELKO_Lease: the leases of this computer, one after the other. One is made
- * for a request; what it changes is seen by all at once, and Lease.dat is rewritten when it ends.
+ * The managed element of VELKO_Lease: the leases of this computer, one after the other.
  *
  * The getters of the current lease answer true. They and the setters throw InstrumentationException
  * when no lease is current.
  */
 class Lease : public RecordElement<LeaseElement> {
 public:
-    /** Stands on the first lease. May throw InstrumentationException, as LeaseBase does. */
-    Lease();
-
-    /** Rewrites the file if this element changed anything; that may throw. */
-    ~Lease() noexcept(false);
-
-    /** Makes a lease. @return true. Throws InstrumentationException when the identifier is taken. */
-    bool createLease(std::string instanceId);
-
-    /** Removes the current lease. Throws InstrumentationException when no filter was set or none is current. */
-    void removeLease();
+    bool createLease(std::string instanceId) { return create(instanceId); }
+    void removeLease() { remove(); }
 
     bool getLessor(std::string& value) const;
     bool getBaseTermCommencementDate(std::string& value) const;  ///< CIM datetime text

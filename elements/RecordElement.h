@@ -7,8 +7,12 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-/** What differs in the wording of two record elements. */
+/** What differs in the wording of two record elements: their texts, and their names in the log. */
 struct RecordElementTexts {
+    const char* name;  ///< element type, its destructor and its operations
+    const char* destructorName;
+    const char* createName;
+    const char* removeName;
     const char* elementName;        ///< value of the ElementName property
     const char* removeUnfiltered;   ///< thrown when a record is to be removed and none was identified
     const char* identifierMissing;  ///< thrown when the current record gives no identifier
@@ -18,12 +22,13 @@ struct RecordElementTexts {
  * An element over a record store: it walks the records in table order, narrowed by filters, and
  * gives access to the current one. The design that Lease and Warranty share.
  *
- * It stands on the first record when made; filters count from setFilter and operator++ on.
+ * One is made for a request. It stands on the first record then; filters count from setFilter and
+ * operator++ on. What it changes is seen by all at once, and the record file is rewritten when it ends.
  *
  * Policy gives:
  *   Base, Property     the record cursor and its property numbers
  *   identifier         the number of the identifier property
- *   unit(), texts()    trace unit and RecordElementTexts of the element
+ *   unit, texts        trace unit and RecordElementTexts of the element
  */
 template <class Policy>
 class RecordElement {
@@ -39,6 +44,14 @@ public:
         std::string reference;  ///< the value that the record must have
     };
 
+    /** Stands on the first record. May throw InstrumentationException, as the store does. */
+    RecordElement();
+
+    /** Rewrites the file if this element changed anything; that may throw. */
+    ~RecordElement() noexcept(false);
+    RecordElement(const RecordElement&) = delete;
+    RecordElement& operator=(const RecordElement&) = delete;
+
     /** Whether the element stands on a record. */
     operator bool();
 
@@ -50,6 +63,12 @@ public:
 
     /** Whether the current record passes all filters. Throws InstrumentationException when none is current. */
     bool evaluate() const;
+
+    /** Makes a record. @return true. Throws InstrumentationException when the identifier is taken. */
+    bool create(std::string instanceId);
+
+    /** Removes the current record. Throws InstrumentationException when no filter was set or no record is current. */
+    void remove();
 
     /** @name Properties that every record has alike
      * A getter that answers false leaves its argument untouched: the property is to stay unset.
@@ -67,12 +86,6 @@ public:
 
 protected:
     using Property = typename Policy::Property;
-
-    RecordElement() = default;
-    ~RecordElement() noexcept(false) = default;
-
-    /** Throws unless a filter identified what is to be removed. */
-    void requireFilter(const CallSite& site) const;
 
     /** Reads or writes a property of the current record under the name of the calling operation. */
     template <class Value>

@@ -12,14 +12,24 @@
 namespace KO::LeaseWarrantyProvider {
 
 template <class Policy>
+RecordElement<Policy>::RecordElement() {
+    const Traced traced(at(Policy::unit, Level::flow, Policy::texts.name));
+}
+
+template <class Policy>
+RecordElement<Policy>::~RecordElement() noexcept(false) {
+    const Traced traced(at(Policy::unit, Level::flow, Policy::texts.destructorName));
+}
+
+template <class Policy>
 RecordElement<Policy>::operator bool() {
-    const Traced traced(at(Policy::unit()));
+    const Traced traced(at(Policy::unit));
     return base;
 }
 
 template <class Policy>
 void RecordElement<Policy>::operator++() {
-    const Traced traced(at(Policy::unit()));
+    const Traced traced(at(Policy::unit));
     do {
         ++base;
     } while (filterSet && base && !evaluate());
@@ -27,7 +37,7 @@ void RecordElement<Policy>::operator++() {
 
 template <class Policy>
 void RecordElement<Policy>::setFilter(FilterType type, std::string reference) {
-    const Traced traced(at(Policy::unit()), label::filterType, type, label::reference, reference);
+    const Traced traced(at(Policy::unit), label::filterType, type, label::reference, reference);
     filterSet = true;
     filters.push_back({type, reference});
     while (base && !evaluate()) {
@@ -37,15 +47,14 @@ void RecordElement<Policy>::setFilter(FilterType type, std::string reference) {
 
 template <class Policy>
 bool RecordElement<Policy>::evaluate() const {
-    const Traced traced(at(Policy::unit()));
+    const Traced traced(at(Policy::unit));
     const auto passes = [&](const Filter& filter) {
         if (filter.type != InstanceIDFilter) {
             return true;
         }
         std::string identifier;
         if (!base.getProperty(Policy::identifier, identifier)) {
-            fail<InstrumentationException>(at(Policy::unit(), Level::error, "evaluate"),
-                                           Policy::texts().identifierMissing);
+            fail<InstrumentationException>(at(Policy::unit, Level::error, "evaluate"), Policy::texts.identifierMissing);
         }
         return identifier == filter.reference;
     };
@@ -54,8 +63,8 @@ bool RecordElement<Policy>::evaluate() const {
 
 template <class Policy>
 bool RecordElement<Policy>::getElementName(std::string& value) const {
-    const Traced traced(at(Policy::unit()));
-    value = Policy::texts().elementName;
+    const Traced traced(at(Policy::unit));
+    value = Policy::texts.elementName;
     return true;
 }
 
@@ -71,34 +80,43 @@ bool notAvailable(const CallSite& site) {
 
 template <class Policy>
 bool RecordElement<Policy>::getCaption(std::string&) const {
-    return notAvailable(at(Policy::unit()));
+    return notAvailable(at(Policy::unit));
 }
 
 template <class Policy>
 bool RecordElement<Policy>::getDescription(std::string&) const {
-    return notAvailable(at(Policy::unit()));
+    return notAvailable(at(Policy::unit));
 }
 
 template <class Policy>
 bool RecordElement<Policy>::getConfigurationName(std::string&) const {
-    return notAvailable(at(Policy::unit()));
+    return notAvailable(at(Policy::unit));
 }
 
 template <class Policy>
 bool RecordElement<Policy>::getChangeableType(unsigned short&) const {
-    return notAvailable(at(Policy::unit()));
+    return notAvailable(at(Policy::unit));
 }
 
 template <class Policy>
 bool RecordElement<Policy>::getInstanceID(std::string& value) const {
-    return get(at(Policy::unit()), Policy::identifier, value);
+    return get(at(Policy::unit), Policy::identifier, value);
 }
 
 template <class Policy>
-void RecordElement<Policy>::requireFilter(const CallSite& site) const {
+bool RecordElement<Policy>::create(std::string instanceId) {
+    const Traced traced(at(Policy::unit, Level::flow, Policy::texts.createName), label::instanceId, instanceId);
+    return base.create(instanceId);
+}
+
+template <class Policy>
+void RecordElement<Policy>::remove() {
+    const CallSite site = at(Policy::unit, Level::flow, Policy::texts.removeName);
+    const Traced traced(site);
     if (!filterSet) {
-        fail<InstrumentationException>(site, Policy::texts().removeUnfiltered);
+        fail<InstrumentationException>(site, Policy::texts.removeUnfiltered);
     }
+    base.remove();
 }
 
 template <class Policy>

@@ -2,6 +2,7 @@
 
 #include "Bodies.h"
 #include "CMPILease.h"
+#include "CMPIWarranty.h"
 
 #include <algorithm>
 #include <array>
@@ -23,10 +24,12 @@ constexpr Body none = &invalidClass;
  * Class id, then the bodies in the order of Operation. An association class is enumerated but, as
  * designed, cannot be got.
  */
-constexpr std::array<DispatchRow, 3> dispatchTable{{
+constexpr std::array<DispatchRow, 4> dispatchTable{{
     // clang-format off
     {20,  {&names<CMPILease>, &instances<CMPILease>, &instances<CMPILease>,
            &create<CMPILease>, &modify<CMPILease>, &remove<CMPILease>, none, none}},
+    {21,  {&names<CMPIWarranty>, &instances<CMPIWarranty>, &instances<CMPIWarranty>,
+           &create<CMPIWarranty>, &modify<CMPIWarranty>, &remove<CMPIWarranty>, none, none}},
     {25,  {none, none, &notSupported, none, none, none, none, none}},
     {32,  {none, none, &notSupported, none, none, none, none, none}},
     // clang-format on

@@ -9,8 +9,16 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-/** What differs in the wording of two record stores. */
+/** What differs in the wording of two record stores: their messages, and their names in the log. */
 struct RecordStoreTexts {
+    const char* unitName;   ///< record type
+    const char* cacheName;  ///< table type, its destructor
+    const char* cacheDestructorName;
+    const char* baseName;  ///< cursor type, its destructor and its operations
+    const char* baseDestructorName;
+    const char* selectName;
+    const char* createName;
+    const char* removeName;
     const char* fileName;            ///< name of the record file in the agent's data directory
     const char* countName;           ///< under which the number of records is traced
     const char* noRecords;           ///< thrown when the count tells of records and there are none
@@ -20,29 +28,55 @@ struct RecordStoreTexts {
 };
 
 /**
+ * The table of one kind of records and its file: what LeaseCache and WarrantyCache share. It is
+ * loaded once, with the library, and written back by whoever changes it. The count, which each kind
+ * names in its own way, is always the number of records in use.
+ */
+template <class Policy>
+class RecordCache : public Policy::Count {
+public:
+    /** Loads the file. Never fails: an absent or unreadable one gives an empty table and count 0. */
+    RecordCache() noexcept;
+    /** Releases the table. The file is not written. */
+    ~RecordCache();
+    RecordCache(const RecordCache&) = delete;
+    RecordCache& operator=(const RecordCache&) = delete;
+
+    /** Rewrites the file from the table. Throws InstrumentationException when it cannot be opened. */
+    void flushCache();
+
+    std::vector<typename Policy::Unit> table{};  ///< in file order, new records at the end, deleted ones included
+};
+
+/**
  * A cursor over the process-wide table of one kind of records, with typed property access: the
  * design that LeaseBase and WarrantyBase share. Each has its own table; they share nothing at run
- * time.
+ * time. One cursor belongs to one request.
  *
  * Changes are in the table at once, seen by every other cursor; the record file is rewritten when a
  * cursor that changed something ends its life. The cursor is an index, so another cursor's append
  * does not disturb it.
  *
  * Policy tells the two apart:
- *   Unit, Property, Cache         record type, property numbers, table type
- *   unit()                        trace unit of the store
- *   texts()                       its RecordStoreTexts
- *   fields()                      its table of RecordField, in file order
- *   cache(), count(), table()     the one table of the process, its record count and its records
- *
- * What a derived class names itself (construction, selection, creation, deletion) it traces itself,
- * under its own name; the protected operations here do that work untraced.
+ *   Unit, Property     record type and property numbers
+ *   Count              base of the table with the record count, to be had from count()
+ *   unit, texts        trace unit and RecordStoreTexts of the store
+ *   fields             its table of RecordField, in file order
+ *   cache()            the one table of the process
  */
 template <class Policy>
 class RecordBase {
 public:
     using Property = typename Policy::Property;
 
+    /** Stands on the first record in use; at the end when the count is 0. Throws when it is not and there is none. */
+    RecordBase();
+
+    /**
+     * Rewrites the record file if this cursor changed anything; that may throw. While another
+     * exception is leaving, a failure is only logged: the process belongs to the object manager.
+     */
+    ~RecordBase() noexcept(false);
     RecordBase(const RecordBase&) = delete;
     RecordBase& operator=(const RecordBase&) = delete;
 
@@ -51,6 +85,20 @@ public:
 
     /** Moves to the next record in use, or to the end; at the end it stays. */
     void operator++();
+
+    /** Moves forward from the current record to the one with the identifier, byte for byte, or to the end. */
+    void select(const std::string& instanceId);
+
+    /**
+     * Appends a record with its identifier and default values. A cursor that stood on an entry then
+     * stands on the new one, a cursor at the end on the first of the table.
+     * @return true
+     * @throws InstrumentationException when a record in use has the identifier
+     */
+    bool create(const std::string& instanceId);
+
+    /** Deletes the current record; the cursor stays. Throws InstrumentationException when there is none. */
+    void remove();
 
     /** @name Typed property access
      * Copies a property of the current record out, or changes it. The getters answer true.
@@ -65,32 +113,6 @@ public:
     ///@}
 
 protected:
-    /** Stands nowhere; positionFirst() follows. */
-    RecordBase() = default;
-    ~RecordBase() = default;
-
-    /** Stands on the first record in use; at the end when the count is 0. Throws when it is not and there is none. */
-    void positionFirst();
-
-    /**
-     * Rewrites the record file if this cursor changed anything. While another exception is leaving,
-     * a failure is only logged: the process belongs to the object manager.
-     */
-    void rewriteIfModified();
-
-    /** Moves forward from the current record to the one with the identifier, or to the end. */
-    void select(const std::string& instanceId);
-
-    /**
-     * Appends a record and moves the cursor to the start of the table.
-     * @return whether the cursor stood on an entry before
-     * @throws InstrumentationException when a record in use has the identifier
-     */
-    bool create(const std::string& instanceId);
-
-    /** Deletes the current record; the cursor stays. Throws when there is none. */
-    void remove();
-
     /** Typed access under the name of the calling operation. */
     template <class Value>
     bool get(const CallSite& site, Property property, Value& value) const;
@@ -101,6 +123,7 @@ private:
     using Unit = typename Policy::Unit;
     static constexpr std::size_t end = std::numeric_limits<std::size_t>::max();
 
+    void rewrite(const CallSite& site);
     void requireCurrent(const CallSite& site) const;
     void skipTo(std::size_t index);
 
@@ -110,14 +133,5 @@ private:
     bool cacheModified = false;
     std::size_t cursor = end;
 };
-
-/** Loads a store's file into its empty table. Never fails: an unreadable file gives an empty table and count 0. */
-template <class Unit>
-void loadStore(const RecordStoreTexts& texts, unsigned int& count, std::vector<Unit>& table) noexcept;
-
-/** Rewrites a store's file from its table. Throws InstrumentationException when it cannot be opened. */
-template <class Unit>
-void flushStore(const CallSite& site, const RecordStoreTexts& texts, unsigned int count,
-                const std::vector<Unit>& table);
 
 }  // namespace KO::LeaseWarrantyProvider

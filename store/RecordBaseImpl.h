@@ -20,49 +20,79 @@ constexpr const char* wrongTypeOrPropertyOfNumber = "Incorrect Type or Property.
 constexpr const char* wrongTypeOrReadOnly = "Incorrect Type or Property or Property is read-Only.";
 }  // namespace
 
-template <class Unit>
-void loadStore(const RecordStoreTexts& texts, unsigned int& count, std::vector<Unit>& table) noexcept {
-    try {
-        loadRecords(dataFilePath(texts.fileName), count, table);
-    } catch (const std::exception&) {
-        count = 0;
-        table.clear();
-    }
-}
-
-template <class Unit>
-void flushStore(const CallSite& site, const RecordStoreTexts& texts, unsigned int count,
-                const std::vector<Unit>& table) {
-    traceVariable(site, texts.countName, count);
-    if (!writeRecords(dataFilePath(texts.fileName), count, table)) {
-        fail<InstrumentationException>(site, texts.fileCannotBeOpened);
-    }
-}
-
 template <class Policy>
 RecordTrace<Policy>::RecordTrace() {
-    const Traced traced(at(Policy::unit(), Level::flow, Policy::unitName));
+    const Traced traced(at(Policy::unit, Level::flow, Policy::texts.unitName));
 }
 
 template <class Policy>
 RecordTrace<Policy>::RecordTrace(const std::string& instanceId) {
-    const Traced traced(at(Policy::unit(), Level::flow, Policy::unitName), label::instanceId, instanceId);
+    const Traced traced(at(Policy::unit, Level::flow, Policy::texts.unitName), label::instanceId, instanceId);
 }
 
 template <class Policy>
 RecordTrace<Policy>::RecordTrace(const RecordTrace& instance) {
-    const Traced traced(at(Policy::unit(), Level::flow, Policy::unitName), label::instance, &instance);
+    const Traced traced(at(Policy::unit, Level::flow, Policy::texts.unitName), label::instance, &instance);
 }
 
 template <class Policy>
 RecordTrace<Policy>& RecordTrace<Policy>::operator=(const RecordTrace& instance) {
-    const Traced traced(at(Policy::unit()), label::instance, &instance);
+    const Traced traced(at(Policy::unit), label::instance, &instance);
     return *this;
 }
 
 template <class Policy>
+RecordCache<Policy>::RecordCache() noexcept {
+    const Traced traced(at(Policy::unit, Level::flow, Policy::texts.cacheName));
+    try {
+        loadRecords(dataFilePath(Policy::texts.fileName), this->count(), table);
+    } catch (const std::exception&) {
+        this->count() = 0;
+        table.clear();
+    }
+}
+
+template <class Policy>
+RecordCache<Policy>::~RecordCache() {
+    const Traced traced(at(Policy::unit, Level::flow, Policy::texts.cacheDestructorName));
+}
+
+template <class Policy>
+void RecordCache<Policy>::flushCache() {
+    const Traced traced(at(Policy::unit));
+    traceVariable(at(Policy::unit), Policy::texts.countName, this->count());
+    if (!writeRecords(dataFilePath(Policy::texts.fileName), this->count(), table)) {
+        fail<InstrumentationException>(at(Policy::unit), Policy::texts.fileCannotBeOpened);
+    }
+}
+
+template <class Policy>
+RecordBase<Policy>::RecordBase() {
+    const Traced traced(at(Policy::unit, Level::flow, Policy::texts.baseName));
+    traceVariable(at(Policy::unit, Level::flow, Policy::texts.baseName), Policy::texts.countName,
+                  Policy::cache().count());
+    if (Policy::cache().count() == 0) {
+        return;
+    }
+    skipTo(0);
+    if (cursor == end) {
+        fail<InstrumentationException>(at(Policy::unit, Level::error, Policy::texts.baseName), Policy::texts.noRecords);
+    }
+}
+
+template <class Policy>
+RecordBase<Policy>::~RecordBase() noexcept(false) {
+    const CallSite site = at(Policy::unit, Level::flow, Policy::texts.baseDestructorName);
+    const Traced traced(site);
+    traceVariable(site, "cacheModified", cacheModified ? 1U : 0U);
+    if (cacheModified) {
+        rewrite(site);
+    }
+}
+
+template <class Policy>
 void RecordBase<Policy>::skipTo(std::size_t index) {
-    const auto& table = Policy::table();
+    const auto& table = Policy::cache().table;
     const auto inUse = [](const Unit& unit) { return unit.inUse; };
     const auto from = table.begin() + static_cast<std::ptrdiff_t>(std::min(index, table.size()));
     const auto found = std::find_if(from, table.end(), inUse);
@@ -70,24 +100,7 @@ void RecordBase<Policy>::skipTo(std::size_t index) {
 }
 
 template <class Policy>
-void RecordBase<Policy>::positionFirst() {
-    traceVariable(at(Policy::unit()), Policy::texts().countName, Policy::count());
-    if (Policy::count() == 0) {
-        cursor = end;
-        return;
-    }
-    skipTo(0);
-    if (cursor == end) {
-        fail<InstrumentationException>(at(Policy::unit()), Policy::texts().noRecords);
-    }
-}
-
-template <class Policy>
-void RecordBase<Policy>::rewriteIfModified() {
-    traceVariable(at(Policy::unit()), "cacheModified", cacheModified ? 1U : 0U);
-    if (!cacheModified) {
-        return;
-    }
+void RecordBase<Policy>::rewrite(const CallSite& site) {
     try {
         Policy::cache().flushCache();
         cacheModified = false;
@@ -95,13 +108,13 @@ void RecordBase<Policy>::rewriteIfModified() {
         if (std::uncaught_exceptions() == 0) {
             throw;
         }
-        traceMessage(at(Policy::unit(), Level::error), failure.what());
+        traceMessage({site.unit, Level::error, site.function, site.line}, failure.what());
     }
 }
 
 template <class Policy>
 RecordBase<Policy>::operator bool() {
-    const Traced traced(at(Policy::unit()));
+    const Traced traced(at(Policy::unit));
     if (cursor != end) {
         skipTo(cursor);
     }
@@ -110,7 +123,7 @@ RecordBase<Policy>::operator bool() {
 
 template <class Policy>
 void RecordBase<Policy>::operator++() {
-    const Traced traced(at(Policy::unit()));
+    const Traced traced(at(Policy::unit));
     if (cursor != end) {
         skipTo(cursor + 1);
     }
@@ -118,7 +131,8 @@ void RecordBase<Policy>::operator++() {
 
 template <class Policy>
 void RecordBase<Policy>::select(const std::string& instanceId) {
-    const auto& table = Policy::table();
+    const Traced traced(at(Policy::unit, Level::flow, Policy::texts.selectName), label::instanceId, instanceId);
+    const auto& table = Policy::cache().table;
     while (cursor != end && !(table[cursor].inUse && table[cursor].InstanceID == instanceId)) {
         skipTo(cursor + 1);
     }
@@ -126,32 +140,40 @@ void RecordBase<Policy>::select(const std::string& instanceId) {
 
 template <class Policy>
 bool RecordBase<Policy>::create(const std::string& instanceId) {
-    auto& table = Policy::table();
+    const CallSite site = at(Policy::unit, Level::flow, Policy::texts.createName);
+    const Traced traced(site, label::instanceId, instanceId);
+    auto& cache = Policy::cache();
     const auto taken = [&](const Unit& unit) { return unit.inUse && unit.InstanceID == instanceId; };
-    if (std::any_of(table.begin(), table.end(), taken)) {
-        fail<InstrumentationException>(at(Policy::unit()), Policy::texts().identifierExists);
+    if (std::any_of(cache.table.begin(), cache.table.end(), taken)) {
+        fail<InstrumentationException>(site, Policy::texts.identifierExists);
     }
     const bool stoodOnEntry = cursor != end;
-    table.push_back(Unit(instanceId));
-    ++Policy::count();
+    cache.table.push_back(Unit(instanceId));
+    ++cache.count();
     cacheModified = true;
     cursor = 0;
-    return stoodOnEntry;
+    if (stoodOnEntry) {
+        select(instanceId);
+    }
+    return true;
 }
 
 template <class Policy>
 void RecordBase<Policy>::remove() {
-    requireCurrent(at(Policy::unit()));
-    Policy::table()[cursor].inUse = false;
-    --Policy::count();
-    traceVariable(at(Policy::unit()), Policy::texts().countName, Policy::count());
+    const CallSite site = at(Policy::unit, Level::flow, Policy::texts.removeName);
+    const Traced traced(site);
+    requireCurrent(site);
+    auto& cache = Policy::cache();
+    cache.table[cursor].inUse = false;
+    --cache.count();
+    traceVariable(site, Policy::texts.countName, cache.count());
     cacheModified = true;
 }
 
 template <class Policy>
 void RecordBase<Policy>::requireCurrent(const CallSite& site) const {
     if (cursor == end) {
-        fail<InstrumentationException>(site, Policy::texts().notAvailable);
+        fail<InstrumentationException>(site, Policy::texts.notAvailable);
     }
 }
 
@@ -159,7 +181,7 @@ void RecordBase<Policy>::requireCurrent(const CallSite& site) const {
 template <class Policy>
 template <class Value>
 Value RecordBase<Policy>::Unit::*RecordBase<Policy>::memberOf(Property property, bool forWriting) {
-    for (const auto& field : Policy::fields()) {
+    for (const auto& field : Policy::fields) {
         if (field.property == property) {
             const auto* member = std::get_if<Value Unit::*>(&field.member);
             return member != nullptr && (!forWriting || writable(field)) ? *member : nullptr;
@@ -177,7 +199,7 @@ bool RecordBase<Policy>::get(const CallSite& site, Property property, Value& val
     if (member == nullptr) {
         fail<InstrumentationException>(site, wrongTypeOrProperty);
     }
-    value = Policy::table()[cursor].*member;
+    value = Policy::cache().table[cursor].*member;
     return true;
 }
 
@@ -190,28 +212,28 @@ void RecordBase<Policy>::set(const CallSite& site, Property property, const Valu
     if (member == nullptr) {
         fail<InstrumentationException>(site, wrongType);
     }
-    Policy::table()[cursor].*member = value;
+    Policy::cache().table[cursor].*member = value;
     cacheModified = true;
 }
 
 template <class Policy>
 bool RecordBase<Policy>::getProperty(Property property, std::string& value) const {
-    return get(at(Policy::unit()), property, value);
+    return get(at(Policy::unit), property, value);
 }
 
 template <class Policy>
 bool RecordBase<Policy>::getProperty(Property property, unsigned int& value) const {
-    return get(at(Policy::unit()), property, value);
+    return get(at(Policy::unit), property, value);
 }
 
 template <class Policy>
 void RecordBase<Policy>::setProperty(Property property, std::string value) {
-    set(at(Policy::unit()), property, value, wrongTypeOrReadOnly);
+    set(at(Policy::unit), property, value, wrongTypeOrReadOnly);
 }
 
 template <class Policy>
 void RecordBase<Policy>::setProperty(Property property, unsigned int value) {
-    set(at(Policy::unit()), property, value, wrongTypeOrPropertyOfNumber);
+    set(at(Policy::unit), property, value, wrongTypeOrPropertyOfNumber);
 }
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -9,7 +9,7 @@ namespace KO::LeaseWarrantyProvider {
  * record types keep the copying that the compiler writes. Moves, as a growing table makes them, are
  * not traced.
  *
- * Policy gives unit(), the trace unit, and unitName, the record type's name.
+ * Policy is that of the records' store.
  */
 template <class Policy>
 class RecordTrace {

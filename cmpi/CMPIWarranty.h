@@ -1,0 +1,29 @@
+#pragma once
+
+#include "PropertyTable.h"
+#include "RecordAdapter.h"
+#include "Warranty.h"
+
+#include <array>
+
+namespace KO::LeaseWarrantyProvider {
+
+/** The CIM class VELKO_Warranty: what the design shared with VELKO_Lease needs to know of it. */
+struct WarrantyClass {
+    using Element = Warranty;
+    static constexpr const char* className = "VELKO_Warranty";
+    static constexpr const char* constructor = "CMPIWarranty";
+    static constexpr const char* destructor = "~CMPIWarranty";
+    static constexpr bool tracesCreation = false;
+    static constexpr const char* modifyPropertiesLabel = " properties=";
+
+    static const TraceUnit unit;
+    static const std::array<PropertyRow<Warranty>, 9> properties;
+};
+
+/** The adapter of VELKO_Warranty. */
+using CMPIWarranty = RecordAdapter<WarrantyClass>;
+
+extern template class RecordAdapter<WarrantyClass>;
+
+}  // namespace KO::LeaseWarrantyProvider

@@ -1,0 +1,56 @@
+#pragma once
+
+#include "RecordBase.h"
+#include "RecordFields.h"
+#include "WarrantyUnit.h"
+
+#include <array>
+#include <string>
+
+namespace KO::LeaseWarrantyProvider {
+
+namespace Properties {
+
+/** The properties of a warranty record. The numbers are fixed: they stand in the log. */
+enum class Warranty : int {
+    InstanceID = 0,
+    Warrantor = 1,
+    CommencementDate = 2,
+    Duration = 3,
+};
+
+}  // namespace Properties
+
+/** The number of warranties in use, which heads the file. */
+struct WarrantyCount {
+    unsigned int recordCountWarranty = 0;
+
+    unsigned int& count() { return recordCountWarranty; }
+};
+
+/** What the design shared with the lease store needs to know of warranties. */
+struct WarrantyStore {
+    using Unit = WarrantyUnit;
+    using Count = WarrantyCount;
+    using Property = Properties::Warranty;
+
+    static const TraceUnit unit;
+    static const RecordStoreTexts texts;
+    static const std::array<RecordField<Unit, Property>, 4> fields;
+    static RecordCache<WarrantyStore>& cache();
+};
+
+/** The warranty table of the process, kept in Warranty.dat. */
+using WarrantyCache = RecordCache<WarrantyStore>;
+
+/** A cursor over the warranty records, with creation and deletion. */
+class WarrantyBase : public RecordBase<WarrantyStore> {
+public:
+    void selectWarranty(const std::string& instanceId) { select(instanceId); }
+    bool createWarranty(const std::string& instanceId) { return create(instanceId); }
+    void deleteWarranty() { remove(); }
+
+    static WarrantyCache cache;
+};
+
+}  // namespace KO::LeaseWarrantyProvider

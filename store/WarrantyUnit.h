@@ -1,0 +1,30 @@
+#pragma once
+
+#include "RecordTrace.h"
+
+#include <fstream>
+#include <string>
+
+namespace KO::LeaseWarrantyProvider {
+
+struct WarrantyStore;
+
+/** The terms of one warranty. */
+struct WarrantyUnit : private RecordTrace<WarrantyStore> {
+    WarrantyUnit() = default;
+    explicit WarrantyUnit(const std::string& instanceId) : RecordTrace(instanceId), InstanceID(instanceId) {}
+
+    bool inUse = true;  ///< false once deleted: the record stays in the table and is passed over
+    unsigned int Duration = 0;
+    std::string InstanceID;  ///< the key, unique among the records in use
+    std::string Warrantor;
+    std::string CommencementDate;  ///< CIM datetime text
+};
+
+/** Reads one record of a warranty file from where the stream stands. A field that cannot be read keeps its value. */
+std::ifstream& operator>>(std::ifstream& source, WarrantyUnit& warranty);
+
+/** Writes one record of a warranty file: four lines, each flushed. */
+std::ofstream& operator<<(std::ofstream& target, const WarrantyUnit& warranty);
+
+}  // namespace KO::LeaseWarrantyProvider
