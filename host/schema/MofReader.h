@@ -12,7 +12,8 @@ namespace cimhost {
 /**
  * Reads MOF: qualifier declarations, classes, instances, and files named by #pragma include, relative to the
  * file that includes them. A file is read once, however often it is named. Any error is a LoadError with
- * file, line and column; what came before it stays in the schema.
+ * file, line and column. A text with a syntax error adds nothing; after any other error, what stands before it is in
+ * the schema.
  */
 class MofReader {
 public:
@@ -24,6 +25,8 @@ public:
     void readText(std::string_view text, const std::string& sourceName, const std::filesystem::path& directory = {});
 
 private:
+    void readOnce(const std::filesystem::path& file);
+
     Schema& schema;  ///< not owned
     std::set<std::filesystem::path> filesRead;
 };

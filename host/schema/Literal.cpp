@@ -1,0 +1,154 @@
+#include "schema/Literal.h"
+
+#include <cfloat>
+#include <cmath>
+#include <limits>
+
+#include "schema/CimType.h"
+#include "schema/Errors.h"
+#include "schema/Text.h"
+
+namespace cimhost {
+namespace {
+
+[[noreturn]] void refuse(const Literal& literal, CMPIType type, const std::string& remedy) {
+    throw ValueError(literal.text + " is not a " + std::string(typeName(type)) + ": " + remedy);
+}
+
+template <typename Integer>
+Scalar integerScalar(const Literal& literal, CMPIType type) {
+    using Limits = std::numeric_limits<Integer>;
+    const std::string range =
+        "it must be an integer from " + std::to_string(Limits::min()) + " to " + std::to_string(Limits::max());
+    const auto* integer = std::get_if<IntegerLiteral>(&literal.value);
+    if (integer == nullptr || integer->tooLarge) {
+        refuse(literal, type, range);
+    }
+    const std::uint64_t magnitude = integer->magnitude;
+    const auto highest = static_cast<std::uint64_t>(Limits::max());
+    const std::uint64_t lowest = Limits::is_signed ? highest + 1 : 0;  // magnitude of the lowest value
+    if (magnitude > (integer->negative ? lowest : highest)) {
+        refuse(literal, type, range);
+    }
+    return static_cast<Integer>(integer->negative ? 0 - magnitude : magnitude);
+}
+
+double realOf(const Literal& literal, CMPIType type) {
+    if (const auto* real = std::get_if<double>(&literal.value)) {
+        return *real;
+    }
+    const auto* integer = std::get_if<IntegerLiteral>(&literal.value);
+    if (integer == nullptr || integer->tooLarge) {
+        refuse(literal, type, "it must be a number such as 1.5");
+    }
+    const auto magnitude = static_cast<double>(integer->magnitude);
+    return integer->negative ? -magnitude : magnitude;
+}
+
+template <typename Real>
+Scalar realScalar(const Literal& literal, CMPIType type) {
+    const double value = realOf(literal, type);
+    if (!std::isfinite(value) || std::fabs(value) > static_cast<double>(std::numeric_limits<Real>::max())) {
+        refuse(literal, type, "it is out of range");
+    }
+    return static_cast<Real>(value);
+}
+
+const std::string& textOf(const Literal& literal, CMPIType type, const std::string& remedy) {
+    const auto* text = std::get_if<std::string>(&literal.value);
+    if (text == nullptr) {
+        refuse(literal, type, remedy);
+    }
+    return *text;
+}
+
+Scalar booleanScalar(const Literal& literal, CMPIType type) {
+    const bool* value = std::get_if<bool>(&literal.value);
+    if (value == nullptr) {
+        refuse(literal, type, "it must be true or false");
+    }
+    return *value;
+}
+
+Scalar characterScalar(const Literal& literal, CMPIType type) {
+    const auto* character = std::get_if<Char16>(&literal.value);
+    if (character == nullptr) {
+        refuse(literal, type, "it must be one character in apostrophes, such as 'a'");
+    }
+    return *character;
+}
+
+Scalar stringScalar(const Literal& literal, CMPIType type) {
+    return textOf(literal, type, "write it in quotation marks, \"" + literal.text + "\"");
+}
+
+Scalar dateTimeScalar(const Literal& literal, CMPIType type) {
+    const std::string remedy =
+        "it must be 25 characters, a time such as \"20260131120000.000000+060\" or an interval such as "
+        "\"00000007000000.000000:000\"";
+    const std::string& text = textOf(literal, type, remedy);
+    if (!isDateTime(text)) {
+        refuse(literal, type, remedy);
+    }
+    return DateTime{text};
+}
+
+struct Converter {
+    CMPIType type;
+    Scalar (*convert)(const Literal&, CMPIType);
+};
+
+constexpr Converter converters[] = {
+    {CMPI_boolean, booleanScalar},
+    {CMPI_char16, characterScalar},
+    {CMPI_string, stringScalar},
+    {CMPI_dateTime, dateTimeScalar},
+    {CMPI_uint8, integerScalar<std::uint8_t>},
+    {CMPI_uint16, integerScalar<std::uint16_t>},
+    {CMPI_uint32, integerScalar<std::uint32_t>},
+    {CMPI_uint64, integerScalar<std::uint64_t>},
+    {CMPI_sint8, integerScalar<std::int8_t>},
+    {CMPI_sint16, integerScalar<std::int16_t>},
+    {CMPI_sint32, integerScalar<std::int32_t>},
+    {CMPI_sint64, integerScalar<std::int64_t>},
+    {CMPI_real32, realScalar<float>},
+    {CMPI_real64, realScalar<double>},
+};
+
+struct LiteralKind {
+    CMPIType operator()(std::monostate) const { return CMPI_null; }
+    CMPIType operator()(bool) const { return CMPI_boolean; }
+    CMPIType operator()(const IntegerLiteral& integer) const { return integer.negative ? CMPI_sint64 : CMPI_uint64; }
+    CMPIType operator()(double) const { return CMPI_real64; }
+    CMPIType operator()(Char16) const { return CMPI_char16; }
+    CMPIType operator()(const std::string&) const { return CMPI_string; }
+};
+
+}  // namespace
+
+Scalar typedScalar(const Literal& literal, CMPIType type) {
+    if (std::holds_alternative<std::monostate>(literal.value)) {
+        return std::monostate{};
+    }
+    for (const Converter& converter : converters) {
+        if (converter.type == type) {
+            return converter.convert(literal, type);
+        }
+    }
+    refuse(literal, type, "a value of this type cannot be written as a constant");
+}
+
+CMPIType literalType(const Literal& literal) {
+    return std::visit(LiteralKind{}, literal.value);
+}
+
+Value singleValue(CMPIType type, Scalar scalar) {
+    Value value{type};
+    if (!std::holds_alternative<std::monostate>(scalar)) {
+        value.isNull = false;
+        value.elements.push_back(std::move(scalar));
+    }
+    return value;
+}
+
+}  // namespace cimhost

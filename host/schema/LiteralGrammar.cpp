@@ -1,0 +1,83 @@
+#include "schema/LiteralGrammar.h"
+
+#include <charconv>
+#include <cmath>
+#include <limits>
+#include <locale>
+#include <sstream>
+
+#include "schema/Errors.h"
+#include "schema/Text.h"
+
+namespace cimhost::grammar {
+namespace {
+
+/** The digits without sign, prefix and suffix, in the base given. */
+Literal readInteger(std::string_view text, std::size_t prefix, std::size_t suffix, int base) {
+    IntegerLiteral integer;
+    std::string_view digits = text;
+    if (digits.front() == '+' || digits.front() == '-') {
+        integer.negative = digits.front() == '-';
+        digits.remove_prefix(1);
+    }
+    digits = digits.substr(prefix, digits.size() - prefix - suffix);
+    const auto result = std::from_chars(digits.data(), digits.data() + digits.size(), integer.magnitude, base);
+    integer.tooLarge = result.ec == std::errc::result_out_of_range;
+    integer.negative = integer.negative && (integer.tooLarge || integer.magnitude != 0);
+    return {integer, std::string(text)};
+}
+
+Literal readReal(std::string_view text) {
+    std::istringstream stream{std::string(text)};
+    stream.imbue(std::locale::classic());
+    double value = 0;
+    stream >> value;
+    if (stream.fail() && value != 0) {
+        value = std::numeric_limits<double>::infinity();  // overflow; the type's check refuses it
+    }
+    return {value, std::string(text)};
+}
+
+Literal readCharacter(std::string_view content) {
+    const std::string written = "'" + std::string(content) + "'";
+    if (content.size() > 2 && content[0] == '\\') {  // an \x escape is the unit itself, also half of a pair
+        std::uint16_t unit = 0;
+        std::from_chars(content.data() + 2, content.data() + content.size(), unit, 16);
+        return {Char16{unit}, written};
+    }
+    Char16 character;
+    if (!singleCharacter(unescaped(content), character.code)) {
+        throw ValueError(written + " is not a char16: it must be one character of 16 bits");
+    }
+    return {character, written};
+}
+
+}  // namespace
+
+Literal readLiteral(const Node& node) {
+    const std::string_view text = node.string_view();
+    if (node.is_type<TrueLiteral>() || node.is_type<FalseLiteral>()) {
+        return {node.is_type<TrueLiteral>(), std::string(text)};
+    }
+    if (node.is_type<DecimalLiteral>()) {
+        return readInteger(text, 0, 0, 10);
+    }
+    if (node.is_type<HexLiteral>()) {
+        return readInteger(text, 2, 0, 16);
+    }
+    if (node.is_type<OctalLiteral>()) {
+        return readInteger(text, 1, 0, 8);
+    }
+    if (node.is_type<BinaryLiteral>()) {
+        return readInteger(text, 0, 1, 2);
+    }
+    if (node.is_type<RealLiteral>()) {
+        return readReal(text);
+    }
+    if (node.is_type<CharacterContent>()) {
+        return readCharacter(text);
+    }
+    return {std::monostate{}, std::string(text)};
+}
+
+}  // namespace cimhost::grammar

@@ -1,0 +1,60 @@
+#pragma once
+
+#include <tao/pegtl.hpp>
+#include <tao/pegtl/contrib/parse_tree.hpp>
+
+#include "schema/Literal.h"
+
+/** Constants as MOF and object paths write them: PEGTL rules without white space around them. */
+namespace cimhost::grammar {
+
+namespace peg = tao::pegtl;
+
+using Node = peg::parse_tree::node;
+
+struct NameStart : peg::sor<peg::alpha, peg::one<'_'>> {};
+struct NameOther : peg::sor<peg::alnum, peg::one<'_'>> {};
+struct Name : peg::seq<NameStart, peg::star<NameOther>> {};
+
+template <typename Word>
+struct Keyword : peg::seq<Word, peg::not_at<NameOther>> {};
+
+struct NullLiteral : Keyword<TAO_PEGTL_ISTRING("null")> {};
+struct TrueLiteral : Keyword<TAO_PEGTL_ISTRING("true")> {};
+struct FalseLiteral : Keyword<TAO_PEGTL_ISTRING("false")> {};
+
+struct Sign : peg::one<'+', '-'> {};
+struct NumberEnd : peg::not_at<peg::sor<NameOther, peg::one<'.'>>> {};
+struct Exponent : peg::seq<peg::one<'e', 'E'>, peg::opt<Sign>, peg::plus<peg::digit>> {};
+
+struct RealLiteral : peg::seq<peg::opt<Sign>, peg::star<peg::digit>, peg::one<'.'>, peg::plus<peg::digit>,
+                              peg::opt<Exponent>, NumberEnd> {};
+struct BinaryLiteral : peg::seq<peg::opt<Sign>, peg::plus<peg::one<'0', '1'>>, peg::one<'b', 'B'>, NumberEnd> {};
+struct HexLiteral : peg::seq<peg::opt<Sign>, peg::one<'0'>, peg::one<'x', 'X'>, peg::plus<peg::xdigit>, NumberEnd> {};
+struct OctalLiteral : peg::seq<peg::opt<Sign>, peg::one<'0'>, peg::plus<peg::range<'0', '7'>>, NumberEnd> {};
+struct DecimalLiteral
+    : peg::seq<peg::opt<Sign>, peg::sor<peg::one<'0'>, peg::seq<peg::range<'1', '9'>, peg::star<peg::digit>>>,
+               NumberEnd> {};
+
+struct UnitEscape : peg::seq<peg::one<'x', 'X'>, peg::rep_min_max<1, 4, peg::xdigit>> {};
+struct Escape : peg::seq<peg::one<'\\'>, peg::sor<UnitEscape, peg::one<'b', 't', 'n', 'f', 'r', '"', '\'', '\\'>>> {};
+
+struct CharacterContent : peg::sor<Escape, peg::utf8::not_one<'\'', '\\', '\n', '\r'>> {};
+struct CharacterLiteral : peg::seq<peg::one<'\''>, CharacterContent, peg::one<'\''>> {};
+
+/** What may stand between quotation marks. Line ends only where the surrounding text is not made of lines. */
+template <char... Refused>
+struct StringContent : peg::star<peg::sor<Escape, peg::not_one<'"', '\\', Refused...>>> {};
+
+struct Number : peg::sor<RealLiteral, BinaryLiteral, HexLiteral, OctalLiteral, DecimalLiteral> {};
+struct Word : peg::sor<NullLiteral, TrueLiteral, FalseLiteral> {};
+
+/** Selects the nodes that readLiteral understands. */
+using LiteralNodes =
+    peg::parse_tree::store_content::on<NullLiteral, TrueLiteral, FalseLiteral, RealLiteral, BinaryLiteral, HexLiteral,
+                                       OctalLiteral, DecimalLiteral, CharacterContent>;
+
+/** The constant that one of the LiteralNodes stands for. ValueError when a character is none of 16 bits. */
+Literal readLiteral(const Node& node);
+
+}  // namespace cimhost::grammar

@@ -1,0 +1,284 @@
+#include "schema/MofBuilder.h"
+
+#include <algorithm>
+#include <stdexcept>
+
+#include "schema/CimType.h"
+#include "schema/Errors.h"
+#include "schema/MofGrammar.h"
+#include "schema/MofValues.h"
+#include "schema/TypedElement.h"
+
+namespace cimhost {
+namespace {
+
+namespace mof = grammar::mof;
+using grammar::Node;
+
+[[noreturn]] void fail(const Node& node, const std::string& text) {
+    const auto position = node.begin();
+    throw LoadError(position.source + ":" + std::to_string(position.line) + ":" + std::to_string(position.column) +
+                    ": " + text);
+}
+
+/** Runs the action; what the model finds wrong is reported at the node. */
+template <typename Action>
+auto at(const Node& node, Action action) {
+    try {
+        return action();
+    } catch (const LoadError&) {
+        throw;
+    } catch (const ValueError& error) {
+        fail(node, error.what());
+    } catch (const PathError& error) {
+        fail(node, error.what());
+    } catch (const std::invalid_argument& error) {
+        fail(node, error.what());
+    }
+}
+
+CMPIType readType(const Node& node) {
+    const std::optional<CMPIType> type = intrinsicType(node.string_view());
+    if (!type) {
+        fail(node, node.string() +
+                       " is no data type: expected boolean, string, datetime, char16, uint8 to uint64, "
+                       "sint8 to sint64, real32, real64, or a class name followed by REF");
+    }
+    return *type;
+}
+
+void applyFlavor(Flavor& flavor, const Node& node) {
+    struct Row {
+        const char* name;
+        bool Flavor::*member;
+        bool value;
+    };
+    constexpr Row rows[] = {
+        {"EnableOverride", &Flavor::overridable, true}, {"DisableOverride", &Flavor::overridable, false},
+        {"ToSubclass", &Flavor::toSubclass, true},      {"ToInstance", &Flavor::toSubclass, true},
+        {"Restricted", &Flavor::toSubclass, false},     {"Translatable", &Flavor::translatable, true}};
+    for (const Row& row : rows) {
+        if (sameName(row.name, node.string_view())) {
+            flavor.*row.member = row.value;
+            return;
+        }
+    }
+    fail(node, node.string() +
+                   " is no flavor: expected EnableOverride, DisableOverride, ToSubclass, Restricted or "
+                   "Translatable");
+}
+
+/** The node's array initialiser or constant. */
+const Node* initializerOf(const Node& node) {
+    const Node* array = findChild<mof::ArrayInitializer>(node);
+    return array != nullptr ? array : findChild<mof::Constant>(node);
+}
+
+Value trueValue() {
+    return singleValue(CMPI_boolean, true);
+}
+
+}  // namespace
+
+void MofBuilder::build(const Node& root) {
+    for (const auto& child : root.children) {
+        buildDeclaration(*child);
+    }
+}
+
+void MofBuilder::buildDeclaration(const Node& node) {
+    const Node* declaration = &node;
+    const Node* qualifiers = nullptr;
+    if (node.is_type<mof::QualifiedDeclaration>()) {
+        qualifiers = node.children.front().get();
+        declaration = node.children.back().get();
+    }
+    if (declaration->is_type<mof::Pragma>()) {
+        buildPragma(*declaration);
+    } else if (declaration->is_type<mof::QualifierDeclaration>()) {
+        buildQualifierDeclaration(*declaration);
+    } else if (declaration->is_type<mof::ClassDeclaration>()) {
+        buildClass(*declaration, qualifiers);
+    } else {
+        buildInstance(*declaration);
+    }
+}
+
+void MofBuilder::buildPragma(const Node& pragma) {
+    if (sameName(findChild<mof::PragmaName>(pragma)->string_view(), "include")) {
+        const Literal file = at(pragma, [&] { return constantLiteral(pragma); });
+        at(pragma, [&] { include(std::get<std::string>(file.value)); });
+    }
+}
+
+void MofBuilder::buildQualifierDeclaration(const Node& node) {
+    QualifierDeclaration declaration;
+    declaration.name = findChild<mof::QualifierName>(node)->string();
+    declaration.type = readType(*findChild<mof::DataType>(node));
+    declaration.isArray = findChild<mof::ArrayMark>(node) != nullptr;
+    declaration.defaultValue = Value{declaration.type, declaration.isArray};
+    if (const Node* value = findChild<mof::DefaultValue>(node)) {
+        const Property type{declaration.name, declaration.type, declaration.isArray};
+        declaration.defaultValue = readValue(*initializerOf(*value), type);
+    }
+    if (const Node* clause = findChild<mof::FlavorClause>(node)) {
+        for (const Node* flavor : children<mof::FlavorName>(*clause)) {
+            applyFlavor(declaration.flavor, *flavor);
+        }
+    }
+    at(node, [&] { schema.add(std::move(declaration)); });
+}
+
+void MofBuilder::buildClass(const Node& node, const Node* qualifiers) {
+    Class declared;
+    declared.name = findChild<mof::ClassName>(node)->string();
+    if (const Node* super = findChild<mof::SuperclassName>(node)) {
+        declared.superclass = super->string();
+    }
+    declared.qualifiers = readQualifiers(qualifiers);
+    for (const Node* feature : children<mof::Feature>(node)) {
+        buildFeature(declared, *feature);
+    }
+    at(node, [&] { schema.add(std::move(declared)); });
+}
+
+void MofBuilder::buildFeature(Class& declared, const Node& feature) const {
+    const std::string name = findChild<mof::FeatureName>(feature)->string();
+    if (findChild<mof::ParameterList>(feature) != nullptr) {
+        declared.methods.push_back({name});
+        return;
+    }
+    Property property{name};
+    const Node& type = *findChild<mof::DataType>(feature);
+    if (findChild<mof::ReferenceMark>(feature) != nullptr) {
+        property.type = CMPI_ref;
+        property.referenceClass = type.string();
+    } else {
+        property.type = readType(type);
+    }
+    property.isArray = findChild<mof::ArrayMark>(feature) != nullptr;
+    property.qualifiers = readQualifiers(findChild<mof::QualifierList>(feature));
+    property.defaultValue = Value{property.type, property.isArray};
+    if (const Node* value = findChild<mof::DefaultValue>(feature)) {
+        property.defaultValue = readValue(*initializerOf(*value), property);
+    }
+    declared.properties.push_back(std::move(property));
+}
+
+std::vector<Qualifier> MofBuilder::readQualifiers(const Node* list) const {
+    std::vector<Qualifier> qualifiers;
+    if (list == nullptr) {
+        return qualifiers;
+    }
+    for (const Node* node : children<mof::Qualifier>(*list)) {
+        Qualifier qualifier = readQualifier(*node);
+        const auto same = [&](const Qualifier& each) { return sameName(each.name, qualifier.name); };
+        if (std::any_of(qualifiers.begin(), qualifiers.end(), same)) {
+            fail(*node, "qualifier " + qualifier.name + " is given twice");
+        }
+        qualifiers.push_back(std::move(qualifier));
+    }
+    return qualifiers;
+}
+
+Qualifier MofBuilder::readQualifier(const Node& node) const {
+    const std::string name = findChild<mof::QualifierName>(node)->string();
+    const QualifierDeclaration* declaration = schema.findQualifier(name);
+    if (declaration == nullptr) {
+        fail(node, "qualifier " + name + " is not declared; declare it (Qualifier " + name +
+                       " : TYPE, Scope(...);) or include the file that does");
+    }
+    Qualifier qualifier{declaration->name, declaration->defaultValue, declaration->flavor};
+    if (const Node* initializer = initializerOf(node)) {
+        qualifier.value = readValue(*initializer, {name, declaration->type, declaration->isArray});
+    } else if (declaration->type == CMPI_boolean && !declaration->isArray) {
+        qualifier.value = trueValue();
+    }
+    for (const Node* flavor : children<mof::FlavorName>(node)) {
+        applyFlavor(qualifier.flavor, *flavor);
+    }
+    return qualifier;
+}
+
+Value MofBuilder::readValue(const Node& initializer, const Property& type) const {
+    if (initializer.is_type<mof::Constant>()) {
+        const Scalar scalar = readElement(initializer, type);
+        const bool isNull = std::holds_alternative<std::monostate>(scalar);
+        if (type.isArray && !isNull) {
+            fail(initializer, type.name + " is an array: expected its values in braces");
+        }
+        Value value = singleValue(type.type, scalar);
+        value.isArray = type.isArray;
+        return value;
+    }
+    if (!type.isArray) {
+        fail(initializer, type.name + " is no array: expected one value without braces");
+    }
+    Value value{type.type, true, false};
+    for (const Node* constant : children<mof::Constant>(initializer)) {
+        value.elements.push_back(readElement(*constant, type));
+    }
+    return value;
+}
+
+Scalar MofBuilder::readElement(const Node& constant, const Property& type) const {
+    if (const Node* alias = findChild<mof::Alias>(constant)) {
+        const auto known = aliases.find(alias->string_view());
+        if (known == aliases.end()) {
+            fail(*alias, alias->string() + " is no alias of an instance declared before");
+        }
+        if (type.type != CMPI_ref) {
+            fail(*alias, type.name + " is no reference and takes no alias");
+        }
+        return std::make_shared<const ObjectPath>(known->second);
+    }
+    return at(constant, [&] { return typedElement(constantLiteral(constant), type, schema, ""); });
+}
+
+void MofBuilder::buildInstance(const Node& node) {
+    const Node& className = *findChild<mof::ClassName>(node);
+    const Class* declared = schema.findClass(className.string_view());
+    if (declared == nullptr) {
+        fail(className, "class " + className.string() + " is not declared; declare or include it first");
+    }
+    Instance instance;
+    instance.path.className = declared->name;
+    const auto find = [&](std::string_view name) {
+        return std::find_if(instance.properties.begin(), instance.properties.end(),
+                            [&](const NamedValue& each) { return sameName(each.name, name); });
+    };
+    for (const Node* assignment : children<mof::Assignment>(node)) {
+        NamedValue property = buildAssignment(*assignment, *declared);
+        if (find(property.name) != instance.properties.end()) {
+            fail(*assignment, property.name + " is given twice");
+        }
+        instance.properties.push_back(std::move(property));
+    }
+    for (const Property& property : declared->properties) {
+        if (!property.defaultValue.isNull && find(property.name) == instance.properties.end()) {
+            instance.properties.push_back({property.name, property.defaultValue});
+        }
+    }
+    for (const Property* key : declared->keys()) {
+        const auto value = find(key->name);
+        if (value == instance.properties.end() || value->value.isNull) {
+            fail(node, "the key " + key->name + " has no value");
+        }
+        instance.path.keys.push_back(*value);
+    }
+    if (const Node* clause = findChild<mof::AliasClause>(node)) {
+        aliases.insert_or_assign(findChild<mof::Alias>(*clause)->string(), instance.path);
+    }
+    schema.add(std::move(instance));
+}
+
+NamedValue MofBuilder::buildAssignment(const Node& assignment, const Class& declared) const {
+    const Node& name = *findChild<mof::AssignedName>(assignment);
+    const Property* property = declared.findProperty(name.string_view());
+    if (property == nullptr) {
+        fail(name, "class " + declared.name + " has no property " + name.string());
+    }
+    return {property->name, readValue(*initializerOf(assignment), *property)};
+}
+
+}  // namespace cimhost

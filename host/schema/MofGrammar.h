@@ -1,0 +1,124 @@
+#pragma once
+
+#include "schema/LiteralGrammar.h"
+
+/** The grammar of MOF (CIM 2) as PEGTL rules, bottom up. After what decides for a rule, the rest is a must. */
+namespace cimhost::grammar::mof {
+
+struct LineComment : peg::seq<peg::two<'/'>, peg::until<peg::eolf>> {};
+struct CommentBody : peg::until<peg::string<'*', '/'>> {};
+struct BlockComment : peg::if_must<peg::string<'/', '*'>, CommentBody> {};
+struct Skip : peg::star<peg::sor<peg::space, LineComment, BlockComment>> {};
+
+template <typename Rule>
+struct Token : peg::seq<Rule, Skip> {};
+template <typename Rule>
+struct Need : peg::must<Token<Rule>> {};
+template <char C>
+struct Mark : Token<peg::one<C>> {};
+template <char C>
+struct NeedMark : peg::must<Mark<C>> {};
+template <typename Item>
+struct CommaList : peg::list_must<Item, Mark<','>> {};
+
+// Constants and initialisers.
+struct StringPart : StringContent<'\n', '\r'> {};
+struct StringEnd : peg::one<'"'> {};
+struct StringLiteral : peg::if_must<peg::one<'"'>, StringPart, StringEnd> {};
+struct StringValue : peg::plus<Token<StringLiteral>> {};
+struct Alias : peg::seq<peg::one<'$'>, Name> {};
+struct Constant : peg::sor<StringValue, Token<peg::sor<Word, Number, CharacterLiteral, Alias>>> {};
+struct ArrayInitializer : peg::seq<Mark<'{'>, peg::opt<CommaList<Constant>>, NeedMark<'}'>> {};
+struct Initializer : peg::sor<ArrayInitializer, Constant> {};
+struct DefaultValue : peg::if_must<Mark<'='>, Initializer> {};
+
+// Qualifiers.
+struct FlavorName : Name {};
+struct QualifierName : Name {};
+struct Flavors : peg::plus<Token<FlavorName>> {};
+struct ParenthesisedValue : peg::seq<Mark<'('>, peg::must<Constant>, NeedMark<')'>> {};
+struct Qualifier : peg::seq<Token<QualifierName>, peg::opt<peg::sor<ParenthesisedValue, ArrayInitializer>>,
+                            peg::opt<peg::if_must<Mark<':'>, Flavors>>> {};
+struct QualifierList : peg::seq<Mark<'['>, peg::must<CommaList<Qualifier>>, NeedMark<']'>> {};
+
+// Properties, references and methods.
+struct DataType : Name {};
+struct FeatureName : Name {};
+struct ParameterName : Name {};
+struct ArraySize : DecimalLiteral {};
+struct ReferenceMark : peg::seq<Keyword<TAO_PEGTL_ISTRING("ref")>, Skip, peg::at<NameStart>> {};
+struct ArrayMark : peg::seq<Mark<'['>, peg::opt<Token<ArraySize>>, NeedMark<']'>> {};
+struct Parameter : peg::seq<peg::opt<QualifierList>, Token<DataType>, peg::opt<ReferenceMark>, Need<ParameterName>,
+                            peg::opt<ArrayMark>> {};
+struct ParameterList : peg::seq<Mark<'('>, peg::opt<CommaList<Parameter>>, NeedMark<')'>> {};
+struct PropertyRest : peg::seq<peg::opt<ArrayMark>, peg::opt<DefaultValue>> {};
+struct UnqualifiedFeature : peg::seq<Token<DataType>, peg::opt<ReferenceMark>, Need<FeatureName>,
+                                     peg::sor<ParameterList, PropertyRest>, NeedMark<';'>> {};
+struct Feature : peg::sor<peg::if_must<QualifierList, UnqualifiedFeature>, UnqualifiedFeature> {};
+
+// Classes.
+struct ClassName : Name {};
+struct SuperclassName : Name {};
+struct AliasClause : peg::seq<Token<Keyword<TAO_PEGTL_ISTRING("as")>>, Need<Alias>> {};
+struct Superclass : peg::seq<Mark<':'>, Need<SuperclassName>> {};
+struct ClassBodyEnd : Mark<'}'> {};
+struct ClassDeclaration
+    : peg::seq<Token<Keyword<TAO_PEGTL_ISTRING("class")>>, Need<ClassName>, peg::opt<AliasClause>, peg::opt<Superclass>,
+               NeedMark<'{'>, peg::star<Feature>, peg::must<ClassBodyEnd>, NeedMark<';'>> {};
+
+// Instances.
+struct OfWord : Keyword<TAO_PEGTL_ISTRING("of")> {};
+struct AssignedName : Name {};
+struct Assignment
+    : peg::seq<peg::opt<QualifierList>, Token<AssignedName>, NeedMark<'='>, peg::must<Initializer>, NeedMark<';'>> {};
+struct InstanceBodyEnd : Mark<'}'> {};
+struct InstanceDeclaration
+    : peg::seq<Token<Keyword<TAO_PEGTL_ISTRING("instance")>>, Need<OfWord>, Need<ClassName>, peg::opt<AliasClause>,
+               NeedMark<'{'>, peg::star<Assignment>, peg::must<InstanceBodyEnd>, NeedMark<';'>> {};
+
+// Qualifier declarations.
+struct ScopeWord : Keyword<TAO_PEGTL_ISTRING("scope")> {};
+struct FlavorWord : Keyword<TAO_PEGTL_ISTRING("flavor")> {};
+struct MetaElement
+    : Keyword<peg::sor<TAO_PEGTL_ISTRING("class"), TAO_PEGTL_ISTRING("association"), TAO_PEGTL_ISTRING("indication"),
+                       TAO_PEGTL_ISTRING("qualifier"), TAO_PEGTL_ISTRING("property"), TAO_PEGTL_ISTRING("reference"),
+                       TAO_PEGTL_ISTRING("method"), TAO_PEGTL_ISTRING("parameter"), TAO_PEGTL_ISTRING("schema"),
+                       TAO_PEGTL_ISTRING("any")>> {};
+struct ScopeClause
+    : peg::seq<NeedMark<','>, Need<ScopeWord>, NeedMark<'('>, peg::must<CommaList<Token<MetaElement>>>, NeedMark<')'>> {
+};
+struct FlavorClause
+    : peg::seq<Mark<','>, Need<FlavorWord>, NeedMark<'('>, peg::must<CommaList<Token<FlavorName>>>, NeedMark<')'>> {};
+struct QualifierDeclaration
+    : peg::seq<Token<Keyword<TAO_PEGTL_ISTRING("qualifier")>>, Need<QualifierName>, NeedMark<':'>, Need<DataType>,
+               peg::opt<ArrayMark>, peg::opt<DefaultValue>, ScopeClause, peg::opt<FlavorClause>, NeedMark<';'>> {};
+
+// Directives and the file.
+struct PragmaWord : Keyword<TAO_PEGTL_ISTRING("pragma")> {};
+struct PragmaName : Name {};
+struct Pragma
+    : peg::seq<Mark<'#'>, Need<PragmaWord>, Need<PragmaName>, NeedMark<'('>, peg::must<StringValue>, NeedMark<')'>> {};
+struct ClassOrInstance : peg::sor<ClassDeclaration, InstanceDeclaration> {};
+struct QualifiedDeclaration : peg::if_must<QualifierList, ClassOrInstance> {};
+struct UnqualifiedDeclaration : ClassOrInstance {};
+struct ByteOrderMark : peg::string<'\xEF', '\xBB', '\xBF'> {};
+struct FileEnd : peg::eof {};
+struct File : peg::seq<peg::opt<ByteOrderMark>, Skip,
+                       peg::star<peg::sor<Pragma, QualifierDeclaration, QualifiedDeclaration, UnqualifiedDeclaration>>,
+                       peg::must<FileEnd>> {};
+
+/** An array's initialiser alone, as values are given outside MOF files. */
+struct LoneArrayEnd : peg::eof {};
+struct LoneArray : peg::seq<Skip, peg::must<ArrayInitializer>, peg::must<LoneArrayEnd>> {};
+
+/** The nodes of which the reader builds its model. */
+template <typename Rule>
+using Selected = peg::parse_tree::selector<
+    Rule, LiteralNodes,
+    peg::parse_tree::store_content::on<
+        StringPart, Alias, Constant, ArrayInitializer, DefaultValue, FlavorName, QualifierName, Qualifier,
+        QualifierList, DataType, FeatureName, ArraySize, ReferenceMark, ArrayMark, ParameterList, Feature, ClassName,
+        SuperclassName, ClassDeclaration, AssignedName, Assignment, InstanceDeclaration, QualifierDeclaration,
+        FlavorClause, PragmaName, Pragma, QualifiedDeclaration, AliasClause>>;
+
+}  // namespace cimhost::grammar::mof

@@ -1,0 +1,157 @@
+#include "schema/ObjectPathText.h"
+
+#include <algorithm>
+
+#include "schema/CimType.h"
+#include "schema/Errors.h"
+#include "schema/MofValues.h"
+#include "schema/MofWriter.h"
+#include "schema/ObjectPathGrammar.h"
+#include "schema/Text.h"
+#include "schema/TypedElement.h"
+
+namespace cimhost {
+namespace {
+
+namespace path = grammar::path;
+namespace peg = tao::pegtl;
+using grammar::Node;
+
+template <typename Rule>
+inline constexpr const char* expected = nullptr;
+template <>
+inline constexpr auto expected<path::Host> = "expected the name of a host after //";
+template <>
+inline constexpr auto expected<path::HostEnd> = "expected / after the host";
+template <>
+inline constexpr auto expected<path::ClassName> =
+    "expected a class name, or a namespace such as root/cimv2 and a colon";
+template <>
+inline constexpr auto expected<path::Key> = "expected Key=value";
+template <>
+inline constexpr auto expected<path::KeyName> = "expected the name of a key";
+template <>
+inline constexpr auto expected<path::Equals> = "expected = after the name of a key";
+template <>
+inline constexpr auto expected<path::KeyValue> =
+    "expected a key's value: a string in quotation marks (a shell needs quotes around the whole path to keep them), a "
+    "number, true or false";
+template <>
+inline constexpr auto expected<path::StringPart> = "expected text";
+template <>
+inline constexpr auto expected<path::StringEnd> =
+    "expected the closing quotation mark; inside of them a quotation mark is written \\\" and a backslash \\\\";
+template <>
+inline constexpr auto expected<path::PathEnd> =
+    "expected the end of the path, or . and Key=value after the class, or a comma and a further key";
+
+struct Errors {
+    template <typename Rule>
+    static constexpr const char* message = expected<Rule>;
+    template <typename Rule>
+    static constexpr bool raise_on_failure = false;
+};
+template <typename Rule>
+using Control = peg::must_if<Errors>::control<Rule>;
+
+Literal readKeyValue(const Node& node) {
+    if (const Node* text = findChild<path::StringPart>(node)) {
+        return {unescaped(text->string_view()), node.string()};
+    }
+    return grammar::readLiteral(*node.children.front());
+}
+
+/** The key's property; null when the class is not known. PathError when the class has no such key. */
+const Property* findKey(const Class* known, std::string_view name) {
+    if (known == nullptr) {
+        return nullptr;
+    }
+    const Property* property = known->findProperty(name);
+    if (property != nullptr && property->isKey()) {
+        return property;
+    }
+    std::string keys;
+    for (const Property* key : known->keys()) {
+        keys += (keys.empty() ? "" : ", ") + key->name;
+    }
+    throw PathError("class " + known->name + " has no key " + std::string(name) +
+                    (keys.empty() ? "; it has no keys at all" : "; its keys are " + keys));
+}
+
+Value keyValue(const Literal& literal, const std::string& name, const Property* key, const Schema& schema,
+               const std::string& defaultNameSpace) {
+    if (std::holds_alternative<std::monostate>(literal.value)) {
+        throw PathError("key " + name + " cannot be null");
+    }
+    if (key == nullptr) {
+        const CMPIType type = literalType(literal);
+        return singleValue(type, typedScalar(literal, type));
+    }
+    try {
+        return singleValue(key->type, typedElement(literal, *key, schema, defaultNameSpace));
+    } catch (const std::runtime_error& error) {
+        throw PathError("key " + name + ": " + error.what());
+    }
+}
+
+void addKey(ObjectPath& result, const Node& node, const Class* known, const Schema& schema,
+            const std::string& defaultNameSpace) {
+    const std::string name = findChild<path::KeyName>(node)->string();
+    const auto same = [&](const NamedValue& key) { return sameName(key.name, name); };
+    if (std::any_of(result.keys.begin(), result.keys.end(), same)) {
+        throw PathError("key " + name + " is given twice");
+    }
+    const Literal literal = readKeyValue(*findChild<path::KeyValue>(node));
+    result.keys.push_back({name, keyValue(literal, name, findKey(known, name), schema, defaultNameSpace)});
+}
+
+ObjectPath buildPath(const Node& root, const Schema& schema, const std::string& defaultNameSpace) {
+    ObjectPath result;
+    const Node* host = findChild<path::Host>(root);
+    const Node* nameSpace = findChild<path::NameSpace>(root);
+    result.host = host != nullptr ? host->string() : "";
+    result.nameSpace = nameSpace != nullptr ? nameSpace->string() : defaultNameSpace;
+    result.className = findChild<path::ClassName>(root)->string();
+    const Class* known = schema.findClass(result.className);
+    for (const Node* key : children<path::Key>(root)) {
+        addKey(result, *key, known, schema, defaultNameSpace);
+    }
+    return result;
+}
+
+}  // namespace
+
+ObjectPath parseObjectPath(std::string_view text, const Schema& schema, const std::string& defaultNameSpace) {
+    const std::string intro = "object path " + std::string(text) + ": ";
+    try {
+        peg::memory_input<> input(text.data(), text.size(), "");
+        const auto root = peg::parse_tree::parse<path::Path, Node, path::Selected, peg::nothing, Control>(input);
+        return buildPath(*root, schema, defaultNameSpace);
+    } catch (const peg::parse_error& error) {
+        throw PathError(intro + "character " + std::to_string(error.positions().front().byte + 1) + ": " +
+                        std::string(error.message()));
+    } catch (const ValueError& error) {
+        throw PathError(intro + error.what());
+    } catch (const PathError& error) {
+        throw PathError(intro + error.what());
+    }
+}
+
+std::string formatObjectPath(const ObjectPath& path) {
+    std::string text;
+    if (!path.host.empty()) {
+        text = "//" + path.host + "/";
+    }
+    if (!path.nameSpace.empty()) {
+        text += path.nameSpace + ":";
+    }
+    text += path.className;
+    char separator = '.';
+    for (const NamedValue& key : path.keys) {
+        text += separator + key.name + "=" + formatMof(key.value);
+        separator = ',';
+    }
+    return text;
+}
+
+}  // namespace cimhost
