@@ -13,24 +13,25 @@ using L = Lease;
 
 /** In the order in which an instance is filled. */
 const std::array<PropertyRow<L>, 18> LeaseClass::properties{{
-    property<L, &L::getCaption>("Caption"),
-    property<L, &L::getDescription>("Description"),
-    property<L, &L::getInstanceID>("InstanceID"),
-    property<L, &L::getElementName>("ElementName"),
-    property<L, &L::getConfigurationName>("ConfigurationName"),
-    property<L, &L::getChangeableType>("ChangeableType"),
-    property<L, &L::getLessor, &L::setLessor>("Lessor"),
-    dateTimeProperty<L, &L::getBaseTermCommencementDate, &L::setBaseTermCommencementDate>("BaseTermCommencementDate"),
-    property<L, &L::getLeaseTerm, &L::setLeaseTerm>("LeaseTerm"),
-    property<L, &L::getEarlyTerminationOption, &L::setEarlyTerminationOption>("EarlyTerminationOption"),
-    property<L, &L::getFixedPricePurchaseOption, &L::setFixedPricePurchaseOption>("FixedPricePurchaseOption"),
-    property<L, &L::getRenewalOption, &L::setRenewalOption>("RenewalOption"),
-    property<L, &L::getBargainRenewalOption, &L::setBargainRenewalOption>("BargainRenewalOption"),
-    property<L, &L::getBaseRent, &L::setBaseRent>("BaseRent"),
-    property<L, &L::getFairMarketRental, &L::setFairMarketRental>("FairMarketRental"),
-    property<L, &L::getFairMarketValue, &L::setFairMarketValue>("FairMarketValue"),
-    property<L, &L::getTerminationValue, &L::setTerminationValue>("TerminationValue"),
-    property<L, &L::getNetMonthlyLeaseRateFactor, &L::setNetMonthlyLeaseRateFactor>("NetMonthlyLeaseRateFactor"),
+    readOnly<L, &L::getCaption>("Caption"),
+    readOnly<L, &L::getDescription>("Description"),
+    readOnly<L, &L::getInstanceID>("InstanceID"),
+    readOnly<L, &L::getElementName>("ElementName"),
+    readOnly<L, &L::getConfigurationName>("ConfigurationName"),
+    readOnly<L, &L::getChangeableType>("ChangeableType"),
+    modifiable<L, &L::getLessor, &L::setLessor>("Lessor"),
+    modifiable<L, &L::getBaseTermCommencementDate, &L::setBaseTermCommencementDate, ValueForm::dateTime>(
+        "BaseTermCommencementDate"),
+    modifiable<L, &L::getLeaseTerm, &L::setLeaseTerm>("LeaseTerm"),
+    modifiable<L, &L::getEarlyTerminationOption, &L::setEarlyTerminationOption>("EarlyTerminationOption"),
+    modifiable<L, &L::getFixedPricePurchaseOption, &L::setFixedPricePurchaseOption>("FixedPricePurchaseOption"),
+    modifiable<L, &L::getRenewalOption, &L::setRenewalOption>("RenewalOption"),
+    modifiable<L, &L::getBargainRenewalOption, &L::setBargainRenewalOption>("BargainRenewalOption"),
+    modifiable<L, &L::getBaseRent, &L::setBaseRent>("BaseRent"),
+    modifiable<L, &L::getFairMarketRental, &L::setFairMarketRental>("FairMarketRental"),
+    modifiable<L, &L::getFairMarketValue, &L::setFairMarketValue>("FairMarketValue"),
+    modifiable<L, &L::getTerminationValue, &L::setTerminationValue>("TerminationValue"),
+    modifiable<L, &L::getNetMonthlyLeaseRateFactor, &L::setNetMonthlyLeaseRateFactor>("NetMonthlyLeaseRateFactor"),
 }};
 
 template class RecordAdapter<LeaseClass>;

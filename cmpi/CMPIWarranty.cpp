@@ -13,15 +13,15 @@ using W = Warranty;
 
 /** In the order in which an instance is filled. */
 const std::array<PropertyRow<W>, 9> WarrantyClass::properties{{
-    property<W, &W::getCaption>("Caption"),
-    property<W, &W::getDescription>("Description"),
-    property<W, &W::getInstanceID>("InstanceID"),
-    property<W, &W::getElementName>("ElementName"),
-    property<W, &W::getConfigurationName>("ConfigurationName"),
-    property<W, &W::getChangeableType>("ChangeableType"),
-    dateTimeProperty<W, &W::getCommencementDate, &W::setCommencementDate>("WarrantyStartDate"),
-    property<W, &W::getDuration, &W::setDuration>("WarrantyDuration"),
-    property<W, &W::getWarrantor, &W::setWarrantor>("Warrantor"),
+    readOnly<W, &W::getCaption>("Caption"),
+    readOnly<W, &W::getDescription>("Description"),
+    readOnly<W, &W::getInstanceID>("InstanceID"),
+    readOnly<W, &W::getElementName>("ElementName"),
+    readOnly<W, &W::getConfigurationName>("ConfigurationName"),
+    readOnly<W, &W::getChangeableType>("ChangeableType"),
+    modifiable<W, &W::getCommencementDate, &W::setCommencementDate, ValueForm::dateTime>("WarrantyStartDate"),
+    modifiable<W, &W::getDuration, &W::setDuration>("WarrantyDuration"),
+    modifiable<W, &W::getWarrantor, &W::setWarrantor>("Warrantor"),
 }};
 
 template class RecordAdapter<WarrantyClass>;

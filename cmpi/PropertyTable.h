@@ -7,6 +7,13 @@
 
 namespace KO::LeaseWarrantyProvider {
 
+/** An instance being filled from an element. The text serves one string property after the other. */
+struct Filling {
+    const CMPIBroker* broker;
+    CMPIInstance* instance;
+    std::string text{};
+};
+
 /**
  * One property of a CIM class. The rows of a class stand in the order in which its instances are
  * filled; they drive both filling and modification.
@@ -15,16 +22,29 @@ template <class Element>
 struct PropertyRow {
     const char* name;
 
-    /** Sets the property from the element, if the element has it. */
-    void (*fill)(const Element& element, const CMPIBroker* broker, CMPIInstance* instance, const char* name);
+    /** Sets the property from the element. */
+    void (*fill)(const Element& element, Filling& filling, const char* name);
 
     /** Changes the element from the instance, if the instance has the property. Null: read-only. */
     void (*modify)(Element& element, const CMPIInstance* instance, const char* name);
 };
 
+/** How a property's value is set: by the type of the getter's value, or from text that says which it is. */
+enum class ValueForm {
+    typed,     ///< string, number or flag
+    text,      ///< string, set as text that is no datetime
+    dateTime,  ///< datetime, given and taken as CIM datetime text
+};
+
+/** Whether a property is set when the getter answers that there is no value: with what the text held before. */
+enum class Presence {
+    whenAnswered,
+    always,
+};
+
 namespace PropertyTableDetail {
 
-/** The class that declares a getter, and the type of value that the getter fills. */
+/** What a getter tells: the class that declares it and the type of its value. */
 template <class Getter>
 struct GetterTraits;
 
@@ -32,66 +52,88 @@ template <class DeclaringClass, class FilledValue>
 struct GetterTraits<bool (DeclaringClass::*)(FilledValue&) const> {
     using Class = DeclaringClass;
     using Value = FilledValue;
+
+    static bool get(const Class& element, bool (Class::*getter)(Value&) const, Value& value) {
+        return (element.*getter)(value);
+    }
+};
+
+template <class DeclaringClass, class ReturnedValue>
+struct GetterTraits<ReturnedValue (DeclaringClass::*)() const> {
+    using Class = DeclaringClass;
+    using Value = ReturnedValue;
+
+    static bool get(const Class& element, Value (Class::*getter)() const, Value& value) {
+        value = (element.*getter)();
+        return true;
+    }
 };
 
 template <auto getter>
-using ClassOf = typename GetterTraits<decltype(getter)>::Class;
+using Traits = GetterTraits<decltype(getter)>;
 
-template <auto getter>
-using ValueOf = typename GetterTraits<decltype(getter)>::Value;
-
-template <class Element, auto getter, bool asDateTime>
-void fill(const Element& element, const CMPIBroker* broker, CMPIInstance* instance, const char* name) {
-    const ClassOf<getter>& declaring = element;
-    ValueOf<getter> value{};
-    if (!(declaring.*getter)(value)) {
-        return;
-    }
-    if constexpr (asDateTime) {
-        ProviderUtilities::setProperty(broker, instance, name, value, true);
+template <ValueForm form, class Value>
+void set(const Filling& filling, const char* name, Value& value) {
+    if constexpr (form == ValueForm::typed) {
+        ProviderUtilities::setProperty(filling.instance, name, value);
     } else {
-        ProviderUtilities::setProperty(instance, name, value);
+        ProviderUtilities::setProperty(filling.broker, filling.instance, name, value, form == ValueForm::dateTime);
     }
 }
 
-inline bool read(const CMPIInstance* instance, const char* name, std::string& value) {
-    return ProviderUtilities::getProperty(instance, name, value, false);
-}
-
-template <class Value>
-bool read(const CMPIInstance* instance, const char* name, Value& value) {
-    return ProviderUtilities::getProperty(instance, name, value);
+template <class Element, auto getter, ValueForm form, Presence presence>
+void fill(const Element& element, Filling& filling, const char* name) {
+    using Value = typename Traits<getter>::Value;
+    const auto fillFrom = [&](Value& value) {
+        if (Traits<getter>::get(element, getter, value) || presence == Presence::always) {
+            set<form>(filling, name, value);
+        }
+    };
+    if constexpr (std::is_same_v<Value, std::string>) {
+        fillFrom(filling.text);
+    } else {
+        Value value{};
+        fillFrom(value);
+    }
 }
 
 template <class Element, auto getter, auto setter>
 void modify(Element& element, const CMPIInstance* instance, const char* name) {
-    ValueOf<getter> value{};
-    if (read(instance, name, value)) {
-        (element.*setter)(value);
-    }
-}
-
-template <class Element, auto getter, auto setter, bool asDateTime>
-constexpr PropertyRow<Element> row(const char* name) {
-    if constexpr (std::is_null_pointer_v<decltype(setter)>) {
-        return {name, &fill<Element, getter, asDateTime>, nullptr};
+    using Value = typename Traits<getter>::Value;
+    Value value{};
+    bool present = false;
+    if constexpr (std::is_same_v<Value, std::string>) {
+        present = ProviderUtilities::getProperty(instance, name, value, false);
     } else {
-        return {name, &fill<Element, getter, asDateTime>, &modify<Element, getter, setter>};
+        present = ProviderUtilities::getProperty(instance, name, value);
+    }
+    if (present) {
+        (element.*setter)(value);
     }
 }
 
 }  // namespace PropertyTableDetail
 
-/** The row of a property whose CIM type is that of the getter's value; read-only without a setter. */
-template <class Element, auto getter, auto setter = nullptr>
-constexpr PropertyRow<Element> property(const char* name) {
-    return PropertyTableDetail::row<Element, getter, setter, false>(name);
+/** The row of a read-only property. */
+template <class Element, auto getter, ValueForm form = ValueForm::typed, Presence presence = Presence::whenAnswered>
+constexpr PropertyRow<Element> readOnly(const char* name) {
+    return {name, &PropertyTableDetail::fill<Element, getter, form, presence>, nullptr};
 }
 
-/** The row of a datetime property, whose getter and setter give and take CIM datetime text. */
-template <class Element, auto getter, auto setter = nullptr>
-constexpr PropertyRow<Element> dateTimeProperty(const char* name) {
-    return PropertyTableDetail::row<Element, getter, setter, true>(name);
+/** The row of a property that a client may change. */
+template <class Element, auto getter, auto setter, ValueForm form = ValueForm::typed>
+constexpr PropertyRow<Element> modifiable(const char* name) {
+    return {name, &PropertyTableDetail::fill<Element, getter, form, Presence::whenAnswered>,
+            &PropertyTableDetail::modify<Element, getter, setter>};
+}
+
+/** Fills an instance from an element, row by row. */
+template <class Rows, class Element>
+void fillInstance(const Rows& rows, const Element& element, const CMPIBroker* broker, CMPIInstance* instance) {
+    Filling filling{broker, instance};
+    for (const auto& row : rows) {
+        row.fill(element, filling, row.name);
+    }
 }
 
 }  // namespace KO::LeaseWarrantyProvider

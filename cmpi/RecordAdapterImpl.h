@@ -5,6 +5,7 @@
 
 #include "KO/Instrumentation.h"
 #include "KO/ProviderUtilities.h"
+#include "PropertyTable.h"
 #include "RecordAdapter.h"
 #include "Trace.h"
 
@@ -97,9 +98,7 @@ CMPIInstance* RecordAdapter<Policy>::getCMPIInstance(const char** properties) {
     const Traced traced(at(Policy::unit), label::properties, properties);
     CMPIInstance* instance = ProviderUtilities::createInstance(broker, getObjectPath());
     if (instance != nullptr) {
-        for (const auto& row : Policy::properties) {
-            row.fill(element, broker, instance, row.name);
-        }
+        fillInstance(Policy::properties, element, broker, instance);
     }
     return instance;
 }

@@ -1,7 +1,9 @@
 #include "Dispatch.h"
 
 #include "Bodies.h"
+#include "CMPIAssetIDDetail.h"
 #include "CMPILease.h"
+#include "CMPIOstrelAgent.h"
 #include "CMPIWarranty.h"
 
 #include <algorithm>
@@ -24,7 +26,7 @@ constexpr Body none = &invalidClass;
  * Class id, then the bodies in the order of Operation. An association class is enumerated but, as
  * designed, cannot be got.
  */
-constexpr std::array<DispatchRow, 4> dispatchTable{{
+constexpr std::array<DispatchRow, 6> dispatchTable{{
     // clang-format off
     {20,  {&names<CMPILease>, &instances<CMPILease>, &instances<CMPILease>,
            &create<CMPILease>, &modify<CMPILease>, &remove<CMPILease>, none, none}},
@@ -32,6 +34,10 @@ constexpr std::array<DispatchRow, 4> dispatchTable{{
            &create<CMPIWarranty>, &modify<CMPIWarranty>, &remove<CMPIWarranty>, none, none}},
     {25,  {none, none, &notSupported, none, none, none, none, none}},
     {32,  {none, none, &notSupported, none, none, none, none, none}},
+    {208, {&names<CMPIOstrelAgent>, &instances<CMPIOstrelAgent>, &instances<CMPIOstrelAgent>,
+           none, none, none, none, none}},
+    {209, {&names<CMPIAssetIDDetail>, &instances<CMPIAssetIDDetail>, &instances<CMPIAssetIDDetail>,
+           none, &modify<CMPIAssetIDDetail>, none, none, none}},
     // clang-format on
 }};
 

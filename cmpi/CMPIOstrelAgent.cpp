@@ -1,0 +1,45 @@
+#include "CMPIOstrelAgent.h"
+
+#include "LoggerNames.h"
+#include "ProductAdapterImpl.h"
+
+namespace KO::LeaseWarrantyProvider {
+
+std::string loggerCMPIOstrelAgent(LoggerNames::provider);
+
+const TraceUnit AgentClass::unit{loggerCMPIOstrelAgent, "CMPIOstrelAgent.cpp"};
+
+using A = OstrelAgent;
+
+const std::array<KeyRow<A>, 5> AgentClass::keys{{
+    key<A, &A::getName>("Name"),
+    key<A, &A::getIdentifyingNumber>("IdentifyingNumber"),
+    key<A, &A::getProductName>("ProductName"),
+    key<A, &A::getVendor>("Vendor"),
+    key<A, &A::getVersion>("Version"),
+}};
+
+/** The order of the keys is not that of the types. */
+const std::array<KeyFilter<A>, 5> AgentClass::filters{{
+    {"Name", A::FILTER_NAME},
+    {"IdentifyingNumber", A::FILTER_IDENTIFYING_NUMBER},
+    {"ProductName", A::FILTER_PRODUCT_NAME},
+    {"Version", A::FILTER_VERSION},
+    {"Vendor", A::FILTER_VENDOR},
+}};
+
+const std::array<PropertyRow<A>, 9> AgentClass::properties{{
+    readOnly<A, &A::getCaption>("Caption"),
+    readOnly<A, &A::getDescription>("Description"),
+    readOnly<A, &A::getBuildNumber>("BuildNumber"),
+    readOnly<A, &A::getStatus>("Status"),
+    readOnly<A, &A::getName>("Name"),
+    readOnly<A, &A::getProductName>("ProductName"),
+    readOnly<A, &A::getIdentifyingNumber>("IdentifyingNumber"),
+    readOnly<A, &A::getVendor>("Vendor"),
+    readOnly<A, &A::getVersion>("Version"),
+}};
+
+template class ProductAdapter<AgentClass>;
+
+}  // namespace KO::LeaseWarrantyProvider

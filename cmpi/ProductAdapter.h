@@ -1,0 +1,87 @@
+#pragma once
+
+#include "PropertyTable.h"
+
+#include <cmpidt.h>
+
+#include <string>
+
+namespace KO::LeaseWarrantyProvider {
+
+/** One key of a class: its name, and how its value is read into a text. A value that is not there leaves the text. */
+template <class Element>
+struct KeyRow {
+    const char* name;
+    void (*read)(const Element& element, std::string& text);
+};
+
+/** The row of a key whose value a getter gives. */
+template <class Element, auto getter>
+constexpr KeyRow<Element> key(const char* name) {
+    return {name, [](const Element& element, std::string& text) {
+                PropertyTableDetail::Traits<getter>::get(element, getter, text);
+            }};
+}
+
+/** A key that narrows a request, and the filter of the element that it becomes. */
+template <class Element>
+struct KeyFilter {
+    const char* name;
+    typename Element::FilterType type;
+};
+
+/**
+ * The adapter of a CIM class that describes an installed product, identified by keys such as name,
+ * vendor and version: the design that CMPIOstrelAgent and CMPIAssetIDDetail share. It stands where
+ * its element stands.
+ *
+ * Policy gives:
+ *   Element              the managed element
+ *   className            the CIM class
+ *   constructor, destructor   their names in the log
+ *   unit                 trace unit
+ *   keys                 table of KeyRow, in the order in which a path carries them
+ *   filters              table of KeyFilter, in the order in which a path's keys are looked at
+ *   properties           table of PropertyRow, in the order in which an instance is filled
+ *   modify(element, instance)   of a class that can be modified
+ */
+template <class Policy>
+class ProductAdapter {
+public:
+    /** Without regard to keys. */
+    ProductAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext, std::string requestNameSpace);
+
+    /** What the path's keys select, or all if it has none. */
+    ProductAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext, const CMPIObjectPath* path);
+
+    ~ProductAdapter();
+    ProductAdapter(const ProductAdapter&) = delete;
+    ProductAdapter& operator=(const ProductAdapter&) = delete;
+
+    /** Whether the adapter stands on an instance. */
+    operator bool();
+
+    /** Moves to the next instance that the path selects. */
+    void operator++();
+
+    /** Makes filters of the path's keys. May throw what the element's filters throw. */
+    void setObjectPath(const CMPIObjectPath* path);
+
+    /** Path of the current instance; null when it cannot be made. */
+    CMPIObjectPath* getObjectPath();
+
+    /** The current instance; null when it cannot be made. */
+    CMPIInstance* getCMPIInstance(const char** properties);
+
+    /** Writes the instance's modifiable properties; a null instance changes nothing. */
+    template <class ModifiablePolicy = Policy>
+    void modifyCMPIInstance(const CMPIInstance* referenceInstance, const char** properties);
+
+private:
+    const CMPIBroker* broker;
+    const CMPIContext* context;
+    std::string nameSpace;
+    typename Policy::Element element{};
+};
+
+}  // namespace KO::LeaseWarrantyProvider

@@ -1,0 +1,418 @@
+#include "AssetIDDetails.h"
+
+#include "AssetKeys.h"
+#include "KO/File.h"
+#include "KO/PlatformUtilities.h"
+#include "KO/Product.h"
+#include "KO/PropertyFile.h"
+#include "KO/Strings.h"
+#include "KO/Utils.h"
+#include "LoggerNames.h"
+#include "Trace.h"
+
+#include <algorithm>
+#include <array>
+#include <ctime>
+#include <variant>
+
+namespace KO {
+
+Mutex _fileMutex;
+
+}  // namespace KO
+
+namespace KO::LeaseWarrantyProvider {
+
+std::string loggerAssetIDDetails(LoggerNames::shortened);
+
+namespace {
+
+const TraceUnit unit{loggerAssetIDDetails, "AssetIDDetails.cpp"};
+
+constexpr const wchar_t* assetFileName = L"asset.dat";
+constexpr const char* assetCaption = "Asset ID Information";
+constexpr unsigned int assetStringArea = 1024;
+constexpr unsigned long withoutLimit = 0xFFFFFFFF;
+constexpr unsigned int presentTime = 3;
+
+/** Stands for an empty label or text, so that all five pairs carry text. */
+constexpr const char* emptyPersonalized = "Null";
+
+struct PairKeys {
+    const char* label;
+    const char* data;
+};
+
+constexpr std::array<PairKeys, AssetIDDetails::pairCount> pairKeys{{
+    {USER_PERSONALIZED_LABEL1_KEY, USER_PERSONALIZED_DATA1_KEY},
+    {USER_PERSONALIZED_LABEL2_KEY, USER_PERSONALIZED_DATA2_KEY},
+    {USER_PERSONALIZED_LABEL3_KEY, USER_PERSONALIZED_DATA3_KEY},
+    {USER_PERSONALIZED_LABEL4_KEY, USER_PERSONALIZED_DATA4_KEY},
+    {USER_PERSONALIZED_LABEL5_KEY, USER_PERSONALIZED_DATA5_KEY},
+}};
+
+/** Holds the file lock while it lives. */
+class FileLock {
+public:
+    FileLock() { _fileMutex.lock(withoutLimit); }
+    ~FileLock() { _fileMutex.unlock(); }
+    FileLock(const FileLock&) = delete;
+    FileLock& operator=(const FileLock&) = delete;
+};
+
+}  // namespace
+
+/** The fixed fields, in the order in which they are read and written. */
+struct AssetIDDetails::StoredFields {
+    struct Field {
+        const char* key;
+        std::variant<std::string AssetIDDetails::*, DateTime AssetIDDetails::*> member;
+        const char* name;  ///< under which a text is traced
+    };
+
+    static constexpr std::array<Field, 11> all{{
+        {USER_ASSET_NUMBER_KEY, &AssetIDDetails::_AssetNumber, "_AssetNumber"},
+        {USER_ASSET_ID_TAG_KEY, &AssetIDDetails::_AssetIdTag, "_AssetIdTag"},
+        {USER_OWNER_NAME_KEY, &AssetIDDetails::_OwnerName, "_OwnerName"},
+        {USER_OWNER_PHONE_KEY, &AssetIDDetails::_OwnerPhone, "_OwnerPhone"},
+        {USER_OWNER_POSITION_KEY, &AssetIDDetails::_OwnerPosition, "_OwnerPosition"},
+        {USER_OWNER_DEPARTMENT_KEY, &AssetIDDetails::_OwnerDepartment, "_OwnerDepartment"},
+        {USER_LAST_INVENTORIED_KEY, &AssetIDDetails::_LastInventoried, nullptr},
+        {USER_SYSTEM_PURCHASE_DATE_KEY, &AssetIDDetails::_PurchaseDate, nullptr},
+        {USER_SYSTEM_LOCATION_KEY, &AssetIDDetails::_SystemLocation, "_SystemLocation"},
+        {USER_ZOPM_PROFILE_KEY, &AssetIDDetails::_ZOPMProfile, "_ZOPMProfile"},
+        {USER_ZOPM_UPDATE_TIME_KEY, &AssetIDDetails::_ZOPMUpdateTime, nullptr},
+    }};
+};
+
+AssetIDDetails::AssetIDDetails() : _FileName(getFileName()) {
+    const Traced traced(at(unit));
+    try {
+        _ComputerNode.selectNode(NodeLexicon::NT_COMPUTER);
+        _SystemNode.selectNode(NodeLexicon::NT_SYSTEM);
+        if (_ComputerNode && _SystemNode) {
+            readAll();
+        }
+    } catch (...) {
+        traceMessage(at(unit), "Throwing Exception in Constructor");
+    }
+}
+
+void AssetIDDetails::readAll() {
+    const CallSite site = at(unit, Level::flow, "AssetIDDetails");
+    PropertyFile file{File::Path(_FileName)};
+    traceMessage(site, "Opening File");
+    const FileLock lock;
+    traceMessage(site, "File Locked successfully");
+    file.open(FILE_MODE_READ);
+    traceMessage(site, "File Open successfully");
+    readFixedFields(file);
+    readPersonalizedPairs(file);
+    _Loaded = true;
+    file.close();
+}
+
+void AssetIDDetails::readFixedFields(PropertyFile& file) {
+    for (const auto& field : StoredFields::all) {
+        if (const auto* text = std::get_if<std::string AssetIDDetails::*>(&field.member)) {
+            this->** text = Utils::ReadStringFromFile(file, field.key);
+            traceVariable(at(unit, Level::flow, "AssetIDDetails"), field.name, this->**text);
+        } else {
+            this->*std::get<DateTime AssetIDDetails::*>(field.member) = Utils::ReadDateFromFile(file, field.key);
+        }
+    }
+}
+
+void AssetIDDetails::readPersonalizedPairs(PropertyFile& file) {
+    const auto readOrNull = [&](const char* key, const char* name) {
+        std::string text = Utils::ReadStringFromFile(file, key);
+        if (text.empty()) {
+            text = emptyPersonalized;
+        }
+        traceVariable(at(unit, Level::flow, "AssetIDDetails"), name, text);
+        return text;
+    };
+    std::vector<PersonalizedPair> pairs;
+    for (const PairKeys& keys : pairKeys) {
+        std::string label = readOrNull(keys.label, "label");
+        std::string data = readOrNull(keys.data, "data");
+        pairs.emplace_back(std::move(label), std::move(data));
+    }
+    _PersonalizedData = std::move(pairs);
+}
+
+void AssetIDDetails::flushAssetData() {
+    const Traced traced(at(unit));
+    try {
+        PropertyFile file{File::Path(_FileName)};
+        const FileLock lock;
+        file.open(FILE_MODE_WRITE);
+        for (const auto& field : StoredFields::all) {
+            if (const auto* text = std::get_if<std::string AssetIDDetails::*>(&field.member)) {
+                Utils::WriteStringToFile(file, field.key, this->**text);
+            } else {
+                Utils::WriteDateToFile(file, field.key, this->*std::get<DateTime AssetIDDetails::*>(field.member));
+            }
+        }
+        for (std::size_t pair = 0; pair < std::min(pairCount, _PersonalizedData.size()); ++pair) {
+            Utils::WriteStringToFile(file, pairKeys[pair].label, _PersonalizedData[pair].first);
+            Utils::WriteStringToFile(file, pairKeys[pair].data, _PersonalizedData[pair].second);
+        }
+        file.close();
+    } catch (...) {
+        traceMessage(at(unit), "Throwing Exception while writing Data");
+    }
+}
+
+std::wstring AssetIDDetails::getFileName() {
+    const Traced traced(at(unit));
+    const FileLock lock;
+    const std::wstring path = make_wstring(PlatformUtilities::getKelsaDataDir()) + assetFileName;
+    try {
+        File file(path);
+        file.open(FILE_MODE_WRITE);
+        file.close();
+        traceMessage(at(unit), "Asset.dat file opened in write mode Successfully");
+    } catch (...) {
+        traceMessage(at(unit, Level::detail), "Failed while opening Asset.dat in write mode");
+    }
+    return path;
+}
+
+AssetIDDetails::operator bool() const {
+    const Traced traced(at(unit));
+    return _ComputerNode;
+}
+
+void AssetIDDetails::operator++() {
+    const Traced traced(at(unit));
+    do {
+        ++_ComputerNode;
+    } while (_FilterActive && _ComputerNode && !evaluate());
+}
+
+void AssetIDDetails::setFilter(FilterType type, std::string value) {
+    const Traced traced(at(unit, Level::error), label::filterType, type, label::reference, value);
+    _FilterActive = true;
+    _Filters.push_back({type, value});
+    while (_ComputerNode && !evaluate()) {
+        ++_ComputerNode;
+    }
+}
+
+bool AssetIDDetails::evaluate() const {
+    const Traced traced(at(unit));
+    return std::all_of(_Filters.begin(), _Filters.end(), [&](const Filter& filter) {
+        std::string value;
+        return !comparedValue(filter.type, value) || value == filter.value;
+    });
+}
+
+bool AssetIDDetails::comparedValue(FilterType type, std::string& value) const {
+    switch (type) {
+        case FILTER_NAME:
+            return _ComputerNode.getProperty(NodeLexicon::PROPERTY_NAME, value);
+        case FILTER_VENDOR:
+            return _SystemNode.getProperty(NodeLexicon::PROPERTY_VENDOR, value);
+        case FILTER_VERSION:
+            value = make_string(Product::getVersion());
+            return true;
+        default:
+            value = _SystemNode.convertPathToString(_SystemNode.getPathToNode());
+            return true;
+    }
+}
+
+/** A stored text, under the name of the calling getter. */
+bool AssetIDDetails::stored(const CallSite& site, const std::string& member, std::string& value) const {
+    const Traced traced(site);
+    if (_Loaded) {
+        value = member;
+    }
+    return _Loaded;
+}
+
+/** A stored date as its text, under the name of the calling getter. */
+bool AssetIDDetails::stored(const CallSite& site, const DateTime& member, std::string& value) const {
+    const Traced traced(site);
+    if (_Loaded) {
+        value = Utils::convertCIMDateTime(member);
+    }
+    return _Loaded;
+}
+
+void AssetIDDetails::store(const CallSite& site, std::string& member, const std::string& value) {
+    const Traced traced(site);
+    member = value;
+}
+
+void AssetIDDetails::store(const CallSite& site, DateTime& member, const std::string& value) {
+    const Traced traced(site);
+    member = Utils::convertStringToDateTime(value);
+}
+
+bool AssetIDDetails::getAssetNumber(std::string& value) const {
+    return stored(at(unit), _AssetNumber, value);
+}
+
+bool AssetIDDetails::getAssetIdTag(std::string& value) const {
+    return stored(at(unit), _AssetIdTag, value);
+}
+
+bool AssetIDDetails::getPrimaryOwnerName(std::string& value) const {
+    return stored(at(unit), _OwnerName, value);
+}
+
+bool AssetIDDetails::getPrimaryOwnerPhone(std::string& value) const {
+    return stored(at(unit), _OwnerPhone, value);
+}
+
+bool AssetIDDetails::getPrimaryOwnerPosition(std::string& value) const {
+    return stored(at(unit), _OwnerPosition, value);
+}
+
+bool AssetIDDetails::getPrimaryOwnerDepartment(std::string& value) const {
+    return stored(at(unit), _OwnerDepartment, value);
+}
+
+bool AssetIDDetails::getSystemLocation(std::string& value) const {
+    return stored(at(unit), _SystemLocation, value);
+}
+
+bool AssetIDDetails::getZOPMProfile(std::string& value) const {
+    return stored(at(unit), _ZOPMProfile, value);
+}
+
+bool AssetIDDetails::getDeploymentProfile(std::string& value) const {
+    return stored(at(unit), _ZOPMProfile, value);
+}
+
+bool AssetIDDetails::getLastInventoried(std::string& value) const {
+    return stored(at(unit), _LastInventoried, value);
+}
+
+bool AssetIDDetails::getPurchaseDate(std::string& value) const {
+    return stored(at(unit), _PurchaseDate, value);
+}
+
+bool AssetIDDetails::getZOPMUpdateTime(std::string& value) const {
+    return stored(at(unit), _ZOPMUpdateTime, value);
+}
+
+bool AssetIDDetails::getDeploymentUpdateTime(std::string& value) const {
+    return stored(at(unit), _ZOPMUpdateTime, value);
+}
+
+bool AssetIDDetails::getPersonalizedData(std::vector<PersonalizedPair>& value) const {
+    const Traced traced(at(unit));
+    if (_Loaded) {
+        value = _PersonalizedData;
+    }
+    return _Loaded;
+}
+
+bool AssetIDDetails::getCSName(std::string& value) const {
+    const Traced traced(at(unit));
+    return _ComputerNode.getProperty(NodeLexicon::PROPERTY_NAME, value);
+}
+
+bool AssetIDDetails::getName(std::string& value) const {
+    const Traced traced(at(unit));
+    return _ComputerNode.getProperty(NodeLexicon::PROPERTY_NAME, value);
+}
+
+bool AssetIDDetails::getVendor(std::string& value) const {
+    const Traced traced(at(unit));
+    return _SystemNode.getProperty(NodeLexicon::PROPERTY_VENDOR, value);
+}
+
+bool AssetIDDetails::getProductName(std::string& value) const {
+    const Traced traced(at(unit));
+    std::string name;
+    if (!_ComputerNode.getProperty(NodeLexicon::PROPERTY_PRODUCT_NAME, name)) {
+        return false;
+    }
+    const std::size_t dash = name.find('-');
+    if (dash != std::string::npos) {
+        // The blank before the dash goes with it. A dash at the very beginning cuts nothing.
+        value = dash == 0 ? name : name.substr(0, dash - 1);
+    }
+    return true;
+}
+
+std::string AssetIDDetails::getIdentifyingNumber() const {
+    const Traced traced(at(unit));
+    return _SystemNode.convertPathToString(_SystemNode.getPathToNode());
+}
+
+std::string AssetIDDetails::getVersion() const {
+    const Traced traced(at(unit));
+    return make_string(Product::getVersion());
+}
+
+std::string AssetIDDetails::getCaption() const {
+    const Traced traced(at(unit));
+    return assetCaption;
+}
+
+std::string AssetIDDetails::getDescription() const {
+    const Traced traced(at(unit));
+    return assetCaption;
+}
+
+unsigned int AssetIDDetails::getAssetIDStringArea() const {
+    const Traced traced(at(unit));
+    return assetStringArea;
+}
+
+std::string AssetIDDetails::getLocalDateTime() const {
+    const Traced traced(at(unit));
+    return Utils::convertCIMDateTime(DateTime(std::time(nullptr), presentTime));
+}
+
+void AssetIDDetails::setAssetNumber(const std::string& value) {
+    store(at(unit), _AssetNumber, value);
+}
+
+void AssetIDDetails::setOwnerName(const std::string& value) {
+    store(at(unit), _OwnerName, value);
+}
+
+void AssetIDDetails::setOwnerPhone(const std::string& value) {
+    store(at(unit), _OwnerPhone, value);
+}
+
+void AssetIDDetails::setOwnerPosition(const std::string& value) {
+    store(at(unit), _OwnerPosition, value);
+}
+
+void AssetIDDetails::setOwnerDepartment(const std::string& value) {
+    store(at(unit), _OwnerDepartment, value);
+}
+
+void AssetIDDetails::setSystemLocation(const std::string& value) {
+    store(at(unit), _SystemLocation, value);
+}
+
+void AssetIDDetails::setZOPMProfile(const std::string& value) {
+    store(at(unit), _ZOPMProfile, value);
+}
+
+void AssetIDDetails::setLastInventoried(const std::string& value) {
+    store(at(unit), _LastInventoried, value);
+}
+
+void AssetIDDetails::setSystemPurchaseDate(const std::string& value) {
+    store(at(unit), _PurchaseDate, value);
+}
+
+void AssetIDDetails::setZOPMUpdateTime(const std::string& value) {
+    store(at(unit), _ZOPMUpdateTime, value);
+}
+
+void AssetIDDetails::setPersonalizedData(const std::vector<PersonalizedPair>& value) {
+    const Traced traced(at(unit));
+    _PersonalizedData = value;
+}
+
+}  // namespace KO::LeaseWarrantyProvider

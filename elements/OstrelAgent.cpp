@@ -1,0 +1,120 @@
+#include "OstrelAgent.h"
+
+#include "Exceptions.h"
+#include "KO/File.h"
+#include "KO/PlatformUtilities.h"
+#include "KO/Product.h"
+#include "KO/Strings.h"
+#include "LoggerNames.h"
+#include "Trace.h"
+
+#include <algorithm>
+#include <array>
+
+namespace KO::LeaseWarrantyProvider {
+
+std::string loggerOstrelAgent(LoggerNames::shortened);
+
+namespace {
+
+const TraceUnit unit{loggerOstrelAgent, "OstrelAgent.cpp"};
+
+constexpr const char* agentCaption = "VEL Ostrel";
+
+/** Only whether it is there counts, not what is in it. */
+constexpr const wchar_t* markerFileName = L"version.lv1";
+constexpr const wchar_t* markedSuffix = L" Tarvik Agent";
+
+std::string displayName() {
+    std::wstring name = Product::getName();
+    if (File::exists(make_wstring(PlatformUtilities::getKelsaDirectory()) + markerFileName)) {
+        name += markedSuffix;
+    }
+    return make_string(name);
+}
+
+/** What a filter type is compared with. */
+struct ComparedValue {
+    OstrelAgent::FilterType type;
+    std::string (OstrelAgent::*get)() const;
+};
+
+constexpr std::array<ComparedValue, 5> comparedValues{{
+    {OstrelAgent::FILTER_NAME, &OstrelAgent::getName},
+    {OstrelAgent::FILTER_IDENTIFYING_NUMBER, &OstrelAgent::getIdentifyingNumber},
+    {OstrelAgent::FILTER_PRODUCT_NAME, &OstrelAgent::getProductName},
+    {OstrelAgent::FILTER_VENDOR, &OstrelAgent::getVendor},
+    {OstrelAgent::FILTER_VERSION, &OstrelAgent::getVersion},
+}};
+
+}  // namespace
+
+OstrelAgent::OstrelAgent() {
+    const Traced traced(at(unit));
+}
+
+OstrelAgent::operator bool() const {
+    const Traced traced(at(unit));
+    return !_Done;
+}
+
+void OstrelAgent::operator++() {
+    const Traced traced(at(unit));
+    _Done = true;
+}
+
+void OstrelAgent::setFilter(FilterType type, std::string value) const {
+    const Traced traced(at(unit, Level::error), label::filterTypeBare, type, label::keyValue, value);
+    const auto ofType = [&](const ComparedValue& compared) { return compared.type == type; };
+    const auto compared = std::find_if(comparedValues.begin(), comparedValues.end(), ofType);
+    if (compared != comparedValues.end() && (this->*compared->get)() != value) {
+        fail<InstrumentationException>(at(unit), "Could not find specified Agent.");
+    }
+}
+
+std::string OstrelAgent::getName() const {
+    const Traced traced(at(unit));
+    return displayName();
+}
+
+std::string OstrelAgent::getProductName() const {
+    const Traced traced(at(unit));
+    return displayName();
+}
+
+std::string OstrelAgent::getVersion() const {
+    const Traced traced(at(unit));
+    return make_string(Product::getVersion());
+}
+
+std::string OstrelAgent::getBuildNumber() const {
+    const Traced traced(at(unit));
+    return make_string(Product::getBuildNumber());
+}
+
+std::string OstrelAgent::getIdentifyingNumber() const {
+    const Traced traced(at(unit));
+    return make_string(Product::getIdentifyingNumber());
+}
+
+std::string OstrelAgent::getVendor() const {
+    const Traced traced(at(unit));
+    return make_string(Product::getVendor());
+}
+
+std::string OstrelAgent::getCaption() const {
+    const Traced traced(at(unit));
+    return agentCaption;
+}
+
+std::string OstrelAgent::getDescription() const {
+    const Traced traced(at(unit));
+    return agentCaption;
+}
+
+std::string OstrelAgent::getStatus() const {
+    const Traced traced(at(unit));
+    return "OK";
+}
+
+}  // namespace KO::LeaseWarrantyProvider
