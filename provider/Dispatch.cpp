@@ -3,8 +3,11 @@
 #include "Bodies.h"
 #include "CMPIAssetIDDetail.h"
 #include "CMPILease.h"
+#include "CMPILeaseSetting.h"
 #include "CMPIOstrelAgent.h"
 #include "CMPIWarranty.h"
+#include "CMPIWarrantySetting.h"
+#include "ClassIds.h"
 
 #include <algorithm>
 #include <array>
@@ -28,15 +31,17 @@ constexpr Body none = &invalidClass;
  */
 constexpr std::array<DispatchRow, 6> dispatchTable{{
     // clang-format off
-    {20,  {&names<CMPILease>, &instances<CMPILease>, &instances<CMPILease>,
+    {ClassId::lease, {&names<CMPILease>, &instances<CMPILease>, &instances<CMPILease>,
            &create<CMPILease>, &modify<CMPILease>, &remove<CMPILease>, none, none}},
-    {21,  {&names<CMPIWarranty>, &instances<CMPIWarranty>, &instances<CMPIWarranty>,
+    {ClassId::warranty, {&names<CMPIWarranty>, &instances<CMPIWarranty>, &instances<CMPIWarranty>,
            &create<CMPIWarranty>, &modify<CMPIWarranty>, &remove<CMPIWarranty>, none, none}},
-    {25,  {none, none, &notSupported, none, none, none, none, none}},
-    {32,  {none, none, &notSupported, none, none, none, none, none}},
-    {208, {&names<CMPIOstrelAgent>, &instances<CMPIOstrelAgent>, &instances<CMPIOstrelAgent>,
+    {ClassId::leaseSetting, {&names<CMPILeaseSetting>, &instances<CMPILeaseSetting>, &notSupported, none, none, none,
+           &associators<CMPILeaseSetting>, &associatorNames<CMPILeaseSetting>}},
+    {ClassId::warrantySetting, {&names<CMPIWarrantySetting>, &instances<CMPIWarrantySetting>, &notSupported, none, none, none,
+           &associators<CMPIWarrantySetting>, &associatorNames<CMPIWarrantySetting>}},
+    {ClassId::ostrelAgent, {&names<CMPIOstrelAgent>, &instances<CMPIOstrelAgent>, &instances<CMPIOstrelAgent>,
            none, none, none, none, none}},
-    {209, {&names<CMPIAssetIDDetail>, &instances<CMPIAssetIDDetail>, &instances<CMPIAssetIDDetail>,
+    {ClassId::assetIDDetails, {&names<CMPIAssetIDDetail>, &instances<CMPIAssetIDDetail>, &instances<CMPIAssetIDDetail>,
            none, &modify<CMPIAssetIDDetail>, none, none, none}},
     // clang-format on
 }};

@@ -1,0 +1,87 @@
+#include "CMPIComputerSystem.h"
+
+#include "Exceptions.h"
+#include "LoggerNames.h"
+#include "Trace.h"
+
+#include <cmpift.h>
+
+#include <utility>
+
+namespace KO::LeaseWarrantyProvider {
+
+std::string loggerCMPILAWComputerSystem(LoggerNames::provider);
+
+namespace {
+
+const TraceUnit unit{loggerCMPILAWComputerSystem, "CMPIComputerSystem.cpp"};
+
+}  // namespace
+
+CMPILAWComputerSystem::CMPILAWComputerSystem(const CMPIBroker* requestBroker, const CMPIContext* requestContext,
+                                             std::string requestNameSpace)
+    : broker(requestBroker), context(requestContext), nameSpace(std::move(requestNameSpace)) {
+    traceMethod(at(unit));
+}
+
+CMPILAWComputerSystem::~CMPILAWComputerSystem() {
+    traceMethod(at(unit));
+}
+
+bool CMPILAWComputerSystem::hasNext() const {
+    CMPIStatus status{CMPI_RC_OK, nullptr};
+    return enumeration != nullptr && enumeration->ft->hasNext(enumeration, &status) == 1;
+}
+
+/** Makes the enumeration's next instance the current one; on failure the current one stays as it is. */
+bool CMPILAWComputerSystem::takeNext() {
+    CMPIStatus status{CMPI_RC_OK, nullptr};
+    const CMPIData next = enumeration->ft->getNext(enumeration, &status);
+    if (status.rc != CMPI_RC_OK) {
+        return false;
+    }
+    const bool isInstance = next.type == CMPI_instance && (next.state & CMPI_nullValue) == 0;
+    current = isInstance ? next.value.inst : nullptr;
+    return true;
+}
+
+void CMPILAWComputerSystem::setObjectPath(const CMPIObjectPath* path) {
+    const Traced traced(at(unit, Level::error), label::objectPath, path);
+    CMPIStatus status{CMPI_RC_OK, nullptr};
+    if (path != nullptr) {
+        enumeration = broker->bft->enumerateInstances(broker, context, path, nullptr, &status);
+    }
+    if (status.rc != CMPI_RC_OK || !hasNext() || !takeNext()) {
+        fail<ProviderException>(at(unit), "Could not obtain an instance of Computer System");
+    }
+}
+
+CMPILAWComputerSystem::operator bool() {
+    const Traced traced(at(unit));
+    return hasNext();
+}
+
+void CMPILAWComputerSystem::operator++() {
+    const Traced traced(at(unit));
+    current = nullptr;
+    if (enumeration != nullptr) {
+        takeNext();
+    }
+}
+
+CMPIObjectPath* CMPILAWComputerSystem::getObjectPath() {
+    const Traced traced(at(unit));
+    if (current == nullptr) {
+        return nullptr;
+    }
+    CMPIStatus status{CMPI_RC_OK, nullptr};
+    CMPIObjectPath* path = current->ft->getObjectPath(current, &status);
+    return status.rc == CMPI_RC_OK ? path : nullptr;
+}
+
+CMPIInstance* CMPILAWComputerSystem::getCMPIInstance(const char** properties) {
+    const Traced traced(at(unit, Level::error), label::properties, properties);
+    return current;
+}
+
+}  // namespace KO::LeaseWarrantyProvider

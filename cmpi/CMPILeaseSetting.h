@@ -1,0 +1,31 @@
+#pragma once
+
+#include "CMPILease.h"
+#include "ClassIds.h"
+#include "LeaseSetting.h"
+#include "SettingAdapter.h"
+
+namespace KO::LeaseWarrantyProvider {
+
+/** The CIM class VELKO_LeaseSetting: what the shared design of the setting associations needs to know of it. */
+struct LeaseSettingClass {
+    using Element = CMPILease;
+    using Setting = LeaseSetting;
+    static constexpr const char* associationClass = "VELKO_LeaseSetting";
+    static constexpr const char* elementClass = "VELKO_Lease";
+    static constexpr unsigned int associationClassId = ClassId::leaseSetting;
+    static constexpr unsigned int elementClassId = ClassId::lease;
+    static constexpr const char* constructor = "CMPILeaseSetting";
+    static constexpr const char* destructor = "~CMPILeaseSetting";
+    static constexpr const char* locate = "locateLease";
+
+    static const TraceUnit unit;
+    static Moniker elementMoniker(LeaseSetting& setting, Moniker& moniker) { return setting.getLeaseMoniker(moniker); }
+};
+
+/** The adapter of VELKO_LeaseSetting. */
+using CMPILeaseSetting = SettingAdapter<LeaseSettingClass>;
+
+extern template class SettingAdapter<LeaseSettingClass>;
+
+}  // namespace KO::LeaseWarrantyProvider

@@ -1,0 +1,33 @@
+#pragma once
+
+#include "CMPIWarranty.h"
+#include "ClassIds.h"
+#include "SettingAdapter.h"
+#include "WarrantySetting.h"
+
+namespace KO::LeaseWarrantyProvider {
+
+/** The CIM class VELKO_WarrantySetting: what the shared design of the setting associations needs to know of it. */
+struct WarrantySettingClass {
+    using Element = CMPIWarranty;
+    using Setting = WarrantySetting;
+    static constexpr const char* associationClass = "VELKO_WarrantySetting";
+    static constexpr const char* elementClass = "VELKO_Warranty";
+    static constexpr unsigned int associationClassId = ClassId::warrantySetting;
+    static constexpr unsigned int elementClassId = ClassId::warranty;
+    static constexpr const char* constructor = "CMPIWarrantySetting";
+    static constexpr const char* destructor = "~CMPIWarrantySetting";
+    static constexpr const char* locate = "locateWarranty";
+
+    static const TraceUnit unit;
+    static Moniker elementMoniker(WarrantySetting& setting, Moniker& moniker) {
+        return setting.getWarrantyMoniker(moniker);
+    }
+};
+
+/** The adapter of VELKO_WarrantySetting. */
+using CMPIWarrantySetting = SettingAdapter<WarrantySettingClass>;
+
+extern template class SettingAdapter<WarrantySettingClass>;
+
+}  // namespace KO::LeaseWarrantyProvider

@@ -1,0 +1,81 @@
+#pragma once
+
+#include "CMPIComputerSystem.h"
+
+#include <cmpidt.h>
+
+#include <string>
+
+namespace KO::LeaseWarrantyProvider {
+
+/**
+ * The adapter of an association between a computer system, its "Antecedent", and a lease or warranty,
+ * its "Dependent": the design that CMPILeaseSetting and CMPIWarrantySetting share.
+ *
+ * The class of the request's path decides what it is: of the association, a list of association
+ * instances; of the computer system, the list of the computer's leases or warranties; of the lease or
+ * warranty, the list of its computers. With a path of any other class it yields nothing.
+ *
+ * Policy gives:
+ *   Element, Setting                    adapter of the lease or warranty, and element of the association
+ *   associationClass, elementClass      the CIM classes
+ *   associationClassId, elementClassId  their class ids
+ *   constructor, destructor, locate     names in the log: of the latter, locateLease or locateWarranty
+ *   unit                                trace unit
+ *   elementMoniker(setting, moniker)    the setting's way from computer to lease or warranty
+ */
+template <class Policy>
+class SettingAdapter {
+public:
+    /** Positioned by the path's class. May throw what its parts throw. */
+    SettingAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext, const CMPIObjectPath* path);
+    ~SettingAdapter() noexcept(false);
+    SettingAdapter(const SettingAdapter&) = delete;
+    SettingAdapter& operator=(const SettingAdapter&) = delete;
+
+    /**
+     * Whether the walk goes on. As the computer end looks one ahead, a walk over computers leaves out
+     * the last one, and an association list pairs the first computer with every lease or warranty.
+     */
+    operator bool();
+
+    /** Moves on: in an association list to the next lease or warranty, after the last to the next computer. */
+    void operator++();
+
+    /** Path of the current association instance; null when it cannot be made. */
+    CMPIObjectPath* getObjectPath();
+
+    /** The current association instance; null when it cannot be made. */
+    CMPIInstance* getCMPIInstance(const char** properties);
+
+    /** Path of the current far end; null when there is none. */
+    CMPIObjectPath* getAssociatorNames();
+
+    /** The current far end; null when there is none. */
+    CMPIInstance* getAssociator(const char** properties);
+
+    /** Path of a computer's lease or warranty; without key if the computer's path has none. */
+    CMPIObjectPath* locateElement(const CMPIObjectPath* computerPath);
+
+    /** Path of the computer of a lease or warranty; without key if that path has none. */
+    CMPIObjectPath* locateComputer(const CMPIObjectPath* elementPath);
+
+private:
+    enum class Mode { computerSource, elementSource, associationList, inert };
+
+    Mode mode() const;
+    void position(const CMPIObjectPath* path);
+
+    template <class Translate>
+    CMPIObjectPath* locate(const char* className, const CMPIObjectPath* source, Translate translate);
+
+    const CMPIBroker* broker;
+    const CMPIContext* context;
+    std::string nameSpace;
+    unsigned int requestedClassId = 0;
+    CMPILAWComputerSystem computer;
+    typename Policy::Element element;
+    typename Policy::Setting setting{};
+};
+
+}  // namespace KO::LeaseWarrantyProvider
