@@ -1,0 +1,56 @@
+#include "configuration/Document.h"
+
+#include "configuration/FileContent.h"
+#include "configuration/Toml.h"
+
+#include <cstdlib>
+#include <sstream>
+
+namespace Agent {
+
+struct Document::Content {
+    toml::table table;
+};
+
+Document::Document() : content(std::make_unique<Content>()) {}
+Document::Document(Document&&) noexcept = default;
+Document& Document::operator=(Document&&) noexcept = default;
+Document::~Document() = default;
+
+Document Document::read(const std::string& path) {
+    const FileContent file = readFile(path);
+    if (file.error == 0) {
+        return parse(file.text, path);
+    }
+    Document document;
+    if (!file.absent()) {
+        document.whatIsWrong = path + " cannot be read (" + errorText(file.error) + "); using the defaults";
+    }
+    return document;
+}
+
+Document Document::readDefault() {
+    const char* path = ::secure_getenv("OSTREL_CONFIG");
+    return read(path != nullptr && *path != '\0' ? path : "/etc/ostrel/agent.toml");
+}
+
+Document Document::parse(std::string_view text, const std::string& name) {
+    Document document;
+    toml::parse_result result = toml::parse(text, name);
+    if (result) {
+        document.content->table = std::move(result).table();
+        return document;
+    }
+    std::ostringstream problem;
+    problem.imbue(std::locale::classic());
+    problem << name << " is not valid TOML (line " << result.error().source().begin.line << ": "
+            << result.error().description() << "); using the defaults";
+    document.whatIsWrong = problem.str();
+    return document;
+}
+
+TableReader Document::root(Problems& problems) const {
+    return TableReader(&content->table, "", problems);
+}
+
+}  // namespace Agent

@@ -1,0 +1,116 @@
+#include "framework/AgentSettings.h"
+
+#include <systemd/sd-id128.h>
+
+#include <charconv>
+
+namespace KO {
+
+namespace {
+
+constexpr std::int64_t largestNumber = 0xFFFF;
+
+/** A number derived from the machine's that does not give the machine's own away. */
+std::string defaultIdentifyingNumber() {
+    const sd_id128_t application = SD_ID128_MAKE(5d, 3e, 0c, 94, 8a, 17, 4b, 62, 9f, 26, c1, 70, de, 48, b3, 05);
+    sd_id128_t number{};
+    if (::sd_id128_get_machine_app_specific(application, &number) < 0) {
+        return "unknown";
+    }
+    char text[SD_ID128_STRING_MAX];
+    return ::sd_id128_to_string(number, text);
+}
+
+std::string directory(Agent::TableReader& table, std::string_view key, const char* defaultDirectory) {
+    std::string path = defaultDirectory;
+    if (std::optional<std::string> configured = table.someText(key)) {
+        if (configured->front() == '/' && configured->find('\0') == std::string::npos) {
+            path = std::move(*configured);
+        } else {
+            table.reject(key, "must be an absolute path");
+        }
+    }
+    if (path.back() != '/') {
+        path += '/';
+    }
+    return path;
+}
+
+void readDirectories(Agent::TableReader table, AgentSettings& settings) {
+    settings.installDirectory = directory(table, "install", "/usr/lib/ostrel/");
+    settings.dataDirectory = directory(table, "data", "/var/lib/ostrel/");
+    table.rejectUnknownKeys();
+}
+
+void readProduct(Agent::TableReader table, AgentSettings& settings) {
+    auto& product = settings.product;
+    product.name = table.someText("name").value_or("Ostrel");
+    product.version = table.someText("version").value_or(AGENT_VERSION);
+    product.buildNumber = table.someText("build_number").value_or("1");
+    if (std::optional<std::string> number = table.someText("identifying_number")) {
+        product.identifyingNumber = std::move(*number);
+    } else {
+        product.identifyingNumber = defaultIdentifyingNumber();
+    }
+    product.vendor = table.someText("vendor").value_or("VEL");
+    table.rejectUnknownKeys();
+}
+
+std::optional<unsigned int> propertyNumber(const std::string& text) {
+    unsigned int number = 0;
+    const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), number);
+    const bool whole = error == std::errc() && end == text.data() + text.size();
+    return whole && number <= largestNumber ? std::optional<unsigned int>(number) : std::nullopt;
+}
+
+void readProperties(Agent::TableReader table, Node& node) {
+    for (auto& [key, value] : table.allTexts()) {
+        if (const std::optional<unsigned int> number = propertyNumber(key)) {
+            node.properties[*number] = value;
+        } else {
+            table.reject(key, "is no property number");
+        }
+    }
+}
+
+void readNode(Agent::TableReader& table, std::vector<Node>& nodes) {
+    const std::optional<std::int64_t> type = table.number("type", 0, largestNumber);
+    const std::optional<std::string> path = table.someText("path");
+    Node node;
+    readProperties(table.table("properties"), node);
+    table.rejectUnknownKeys();
+    for (const char* key : {"type", "path"}) {
+        if (!table.has(key)) {
+            table.reject(key, "is missing");
+        }
+    }
+    if (type && path) {
+        node.type = static_cast<unsigned int>(*type);
+        node.path = *path;
+        nodes.push_back(std::move(node));
+    }
+}
+
+void readInstrumentation(Agent::TableReader table, AgentSettings& settings) {
+    settings.dmiRoot = directory(table, "dmi_root", "/sys/class/dmi/id/");
+    settings.discover = table.flag("discover").value_or(true);
+    for (Agent::TableReader& node : table.tables("node")) {
+        readNode(node, settings.nodes);
+    }
+    table.rejectUnknownKeys();
+}
+
+}  // namespace
+
+AgentSettings readAgentSettings(const Agent::Document& document, Agent::Problems& problems) {
+    AgentSettings settings;
+    Agent::TableReader root = document.root(problems);
+    readDirectories(root.table("directories"), settings);
+    readProduct(root.table("product"), settings);
+    readInstrumentation(root.table("instrumentation"), settings);
+    root.has("log");  // read by the logging library
+    root.rejectUnknownKeys();
+    return settings;
+}
+
+}  // namespace KO

@@ -1,0 +1,162 @@
+#include "framework/ComputerDiscovery.h"
+
+#include "KO/NodeLexicon.h"
+#include "configuration/FileContent.h"
+#include "configuration/Utf8.h"
+#include "framework/AsciiCase.h"
+
+#include <unistd.h>
+
+#include <algorithm>
+#include <charconv>
+
+namespace KO {
+
+namespace {
+
+/** What careless firmware says where it has nothing to say; compared without regard to letter case. */
+constexpr const char* placeholders[] = {
+    "",
+    "default string",
+    "invalid",
+    "n/a",
+    "none",
+    "not applicable",
+    "not available",
+    "not specified",
+    "o.e.m.",
+    "oem",
+    "product name",
+    "system manufacturer",
+    "system product name",
+    "to be filled by o.e.m",
+    "to be filled by o.e.m.",
+    "undefined",
+    "unknown",
+};
+
+/** The words of SMBIOS for its chassis types, from 1 on; empty for those that tell nothing. */
+constexpr const char* chassisWords[] = {
+    "",  // Other
+    "",  // Unknown
+    "Desktop",
+    "Low Profile Desktop",
+    "Pizza Box",
+    "Mini Tower",
+    "Tower",
+    "Portable",
+    "Laptop",
+    "Notebook",
+    "Hand Held",
+    "Docking Station",
+    "All in One",
+    "Sub Notebook",
+    "Space-saving",
+    "Lunch Box",
+    "Main Server Chassis",
+    "Expansion Chassis",
+    "SubChassis",
+    "Bus Expansion Chassis",
+    "Peripheral Chassis",
+    "RAID Chassis",
+    "Rack Mount Chassis",
+    "Sealed-case PC",
+    "Multi-system chassis",
+    "Compact PCI",
+    "Advanced TCA",
+    "Blade",
+    "Blade Enclosure",
+    "Tablet",
+    "Convertible",
+    "Detachable",
+    "IoT Gateway",
+    "Embedded PC",
+    "Mini PC",
+    "Stick PC",
+};
+
+bool isPlaceholder(const std::string& text) {
+    return std::any_of(std::begin(placeholders), std::end(placeholders),
+                       [&text](const char* placeholder) { return equalIgnoringCase(placeholder, text); });
+}
+
+/** Folds runs of blanks, control characters and bytes that are not UTF-8 into one blank; none at the ends. */
+std::string tidy(std::string_view text) {
+    std::string tidied;
+    for (; !text.empty();) {
+        const Agent::Utf8Character character = Agent::firstCharacter(text);
+        if (character.valid && character.codePoint > ' ' &&
+            (character.codePoint < 0x7f || character.codePoint > 0x9f)) {
+            tidied += text.substr(0, character.length);
+        } else if (!tidied.empty() && tidied.back() != ' ') {
+            tidied += ' ';
+        }
+        text.remove_prefix(character.length);
+    }
+    if (!tidied.empty() && tidied.back() == ' ') {
+        tidied.pop_back();
+    }
+    return tidied;
+}
+
+/** The text of a DMI file; empty if the file is absent or unreadable, or says nothing. */
+std::string readDmi(const std::string& path, Agent::Problems& problems) {
+    const Agent::FileContent file = Agent::readFile(path);
+    if (file.error != 0 && !file.absent()) {
+        problems.push_back(path + " cannot be read: " + Agent::errorText(file.error));
+    }
+    const std::string text = tidy(file.text);
+    return isPlaceholder(text) ? std::string() : text;
+}
+
+std::string orElse(std::string text, const char* fallback) {
+    return text.empty() ? fallback : text;
+}
+
+std::string chassisWord(const std::string& text) {
+    constexpr unsigned int lockBit = 0x80;
+    unsigned int type = 0;
+    const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), type);
+    type &= ~lockBit;
+    if (error != std::errc() || end != text.data() + text.size() || type < 1 || type > std::size(chassisWords)) {
+        return {};
+    }
+    return chassisWords[type - 1];
+}
+
+/** "model - suffix". Readers cut the name at its first dash, so the model must not have one. */
+std::string productName(std::string model, const std::string& chassis) {
+    std::replace(model.begin(), model.end(), '-', ' ');
+    return orElse(tidy(model), "Computer") + " - " + orElse(chassisWord(chassis), "Computer");
+}
+
+}  // namespace
+
+std::string hostName() {
+    char name[256] = {};
+    if (::gethostname(name, sizeof name - 1) != 0 || name[0] == '\0') {
+        return "localhost";
+    }
+    return name;
+}
+
+NodeTree discoverComputer(const std::string& dmiRoot, const std::string& name, Agent::Problems& problems) {
+    Node system;
+    system.type = NodeLexicon::NT_SYSTEM;
+    system.path = "/system";
+    system.properties[NodeLexicon::PROPERTY_NAME] = name;
+    system.properties[NodeLexicon::PROPERTY_VENDOR] = orElse(readDmi(dmiRoot + "sys_vendor", problems), "Unknown");
+    system.properties[NodeLexicon::PROPERTY_PRODUCT_NAME] =
+        productName(readDmi(dmiRoot + "product_name", problems), readDmi(dmiRoot + "chassis_type", problems));
+
+    Node computer = system;
+    computer.type = NodeLexicon::NT_COMPUTER;
+    computer.path = "/system/computer";
+
+    NodeTree tree;
+    tree.put(std::move(system));
+    tree.put(std::move(computer));
+    return tree;
+}
+
+}  // namespace KO

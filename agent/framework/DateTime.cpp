@@ -1,0 +1,53 @@
+#include "KO/DateTime.h"
+
+#include "framework/CimDateTime.h"
+#include "framework/DateTimeAccess.h"
+
+#include <ctime>
+
+namespace KO {
+
+namespace {
+
+constexpr unsigned int localTime = 3;
+
+/** Minutes by which local time is ahead of UTC at a moment. */
+int localOffset(std::time_t moment) {
+    std::tm fields{};
+    return ::localtime_r(&moment, &fields) != nullptr ? static_cast<int>(fields.tm_gmtoff / 60) : 0;
+}
+
+}  // namespace
+
+/** The date is held as its text, in which nothing is lost that a client gave; empty is no date. */
+struct DateTime::Implementation {
+    std::string text;
+};
+
+DateTime::DateTime() : implementation(std::make_unique<Implementation>()) {}
+
+DateTime::DateTime(long seconds, unsigned int kind) : DateTime() {
+    implementation->text = pointInTimeText(seconds, kind == localTime ? localOffset(seconds) : 0);
+}
+
+DateTime::DateTime(const DateTime& other) : implementation(std::make_unique<Implementation>(*other.implementation)) {}
+DateTime::~DateTime() = default;
+
+DateTime& DateTime::operator=(const DateTime& other) {
+    implementation->text = other.implementation->text;
+    return *this;
+}
+
+std::string DateTimeAccess::text(const DateTime& date) {
+    return date.implementation->text;
+}
+
+DateTime DateTimeAccess::fromText(const std::string& text) {
+    DateTime date;
+    if (isPointInTime(text)) {
+        date.implementation->text = text;
+    }
+    return date;
+}
+
+}  // namespace KO

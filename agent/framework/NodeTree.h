@@ -1,0 +1,28 @@
+#pragma once
+
+#include <map>
+#include <string>
+#include <vector>
+
+namespace KO {
+
+/** A node of the instrumentation tree. Types and property numbers are those of KO::NodeLexicon. */
+struct Node {
+    unsigned int type = 0;
+    std::string path;
+    std::map<unsigned int, std::string> properties;
+};
+
+/** The nodes of the managed system, in tree order; no two have the same path. */
+class NodeTree {
+public:
+    /** Adds a node at the end, or puts it in the place of the one at its path. */
+    void put(Node node);
+
+    const std::vector<Node>& nodes() const { return allNodes; }
+
+private:
+    std::vector<Node> allNodes;
+};
+
+}  // namespace KO

@@ -1,0 +1,227 @@
+#include "KO/ProviderUtilities.h"
+
+#include "KO/Moniker.h"
+#include "framework/AsciiCase.h"
+#include "framework/CimDateTime.h"
+#include "framework/CmpiValue.h"
+
+#include <algorithm>
+
+namespace KO {
+
+namespace {
+
+struct ClassId {
+    const char* className;
+    unsigned short id;
+};
+
+constexpr ClassId classIds[] = {
+    {"VELKO_ComputerSystem", 1},   {"VELKO_Lease", 20},           {"VELKO_Warranty", 21},
+    {"VELKO_LeaseSetting", 25},    {"VELKO_WarrantySetting", 32}, {"VELKO_OstrelAgent", 208},
+    {"VELKO_AssetIDDetails", 209},
+};
+
+/** By the convention of CMPI, a value of type CMPI_chars is the characters themselves. */
+const CMPIValue* asValue(const char* characters) {
+    return reinterpret_cast<const CMPIValue*>(characters);
+}
+
+CMPIData getKey(const CMPIObjectPath* path, const char* name, CMPIStatus& status) {
+    return name != nullptr ? callTable<&CMPIObjectPathFT::getKey>(path, name, &status) : CMPIData{};
+}
+
+void addKey(CMPIObjectPath* path, const char* name, const CMPIValue* value, CMPIType type) {
+    if (name != nullptr) {
+        callTable<&CMPIObjectPathFT::addKey>(path, name, value, type);
+    }
+}
+
+CMPIData getPropertyData(const CMPIInstance* instance, const char* name, CMPIStatus& status) {
+    return name != nullptr ? callTable<&CMPIInstanceFT::getProperty>(instance, name, &status) : CMPIData{};
+}
+
+/** @param value null sets the property to null */
+void setPropertyValue(CMPIInstance* instance, const char* name, const CMPIValue* value, CMPIType type) {
+    if (name != nullptr) {
+        callTable<&CMPIInstanceFT::setProperty>(instance, name, value, type);
+    }
+}
+
+CMPIDateTime* makeDateTime(const CMPIBroker* broker, const std::string& text) {
+    if (!isPointInTime(text) && !isInterval(text)) {
+        return nullptr;
+    }
+    return makeObject<&CMPIBrokerEncFT::newDateTimeFromChars>(broker, text.c_str());
+}
+
+/** Hands a value over if there is one. @return whether there was */
+template <typename Value>
+bool deliver(std::optional<Value> found, Value& value) {
+    if (found) {
+        value = std::move(*found);
+    }
+    return found.has_value();
+}
+
+}  // namespace
+
+unsigned short ProviderUtilities::getClassId(const CMPIObjectPath* path) {
+    CMPIStatus status{};
+    const std::optional<std::string> name = textOf(callTable<&CMPIObjectPathFT::getClassName>(path, &status));
+    return name ? getClassId(name->c_str()) : static_cast<unsigned short>(0);
+}
+
+unsigned short ProviderUtilities::getClassId(const char* className) {
+    if (className != nullptr) {
+        for (const ClassId& entry : classIds) {
+            if (equalIgnoringCase(entry.className, className)) {
+                return entry.id;
+            }
+        }
+    }
+    return 0;
+}
+
+std::string ProviderUtilities::getNamespace(const CMPIObjectPath* path) {
+    CMPIStatus status{};
+    return textOf(callTable<&CMPIObjectPathFT::getNameSpace>(path, &status)).value_or(std::string());
+}
+
+unsigned short ProviderUtilities::getKeyCount(const CMPIObjectPath* path) {
+    CMPIStatus status{};
+    const CMPICount count = callTable<&CMPIObjectPathFT::getKeyCount>(path, &status);
+    return static_cast<unsigned short>(std::min<CMPICount>(count, 0xFFFF));
+}
+
+bool ProviderUtilities::getKeyProperty(const CMPIObjectPath* path, const char* name, std::string& value) {
+    CMPIStatus status{};
+    const CMPIData data = getKey(path, name, status);
+    return deliver(textOf(data, status), value);
+}
+
+bool ProviderUtilities::getKeyProperty(const CMPIObjectPath* path, const char* name, CMPIObjectPath** value) {
+    CMPIStatus status{};
+    const CMPIData data = getKey(path, name, status);
+    CMPIObjectPath* reference = referenceOf(data, status);
+    if (reference == nullptr || value == nullptr) {
+        return false;
+    }
+    *value = reference;
+    return true;
+}
+
+CMPIObjectPath* ProviderUtilities::createObjectPath(const CMPIBroker* broker, const char* className,
+                                                    std::string nameSpace) {
+    if (className == nullptr) {
+        return nullptr;
+    }
+    return makeObject<&CMPIBrokerEncFT::newObjectPath>(broker, nameSpace.c_str(), className);
+}
+
+void ProviderUtilities::setKeyProperty(CMPIObjectPath* path, const char* name, const std::string& value) {
+    addKey(path, name, asValue(value.c_str()), CMPI_chars);
+}
+
+void ProviderUtilities::setKeyProperty(CMPIObjectPath* path, const char* name, CMPIObjectPath* value) {
+    if (value != nullptr) {
+        CMPIValue reference{};
+        reference.ref = value;
+        addKey(path, name, &reference, CMPI_ref);
+    }
+}
+
+CMPIInstance* ProviderUtilities::createInstance(const CMPIBroker* broker, CMPIObjectPath* path) {
+    return path != nullptr ? makeObject<&CMPIBrokerEncFT::newInstance>(broker, path) : nullptr;
+}
+
+void ProviderUtilities::setProperty(CMPIInstance* instance, const char* name, std::string& value) {
+    setPropertyValue(instance, name, asValue(value.c_str()), CMPI_chars);
+}
+
+void ProviderUtilities::setProperty(CMPIInstance* instance, const char* name, unsigned short value) {
+    CMPIValue number{};
+    number.uint16 = value;
+    setPropertyValue(instance, name, &number, CMPI_uint16);
+}
+
+void ProviderUtilities::setProperty(CMPIInstance* instance, const char* name, unsigned int value) {
+    CMPIValue number{};
+    number.uint32 = value;
+    setPropertyValue(instance, name, &number, CMPI_uint32);
+}
+
+void ProviderUtilities::setProperty(CMPIInstance* instance, const char* name, bool value) {
+    CMPIValue flag{};
+    flag.boolean = value ? 1 : 0;
+    setPropertyValue(instance, name, &flag, CMPI_boolean);
+}
+
+void ProviderUtilities::setProperty(CMPIInstance* instance, const char* name, CMPIObjectPath* value) {
+    if (value != nullptr) {
+        CMPIValue reference{};
+        reference.ref = value;
+        setPropertyValue(instance, name, &reference, CMPI_ref);
+    }
+}
+
+void ProviderUtilities::setProperty(const CMPIBroker* broker, CMPIInstance* instance, const char* name,
+                                    std::string& text, bool isDateTime) {
+    if (!isDateTime) {
+        setProperty(instance, name, text);
+        return;
+    }
+    CMPIValue value{};
+    value.dateTime = makeDateTime(broker, text);
+    setPropertyValue(instance, name, value.dateTime != nullptr ? &value : nullptr, CMPI_dateTime);
+}
+
+bool ProviderUtilities::getProperty(const CMPIInstance* instance, const char* name, std::string& value,
+                                    bool /*isDateTime*/) {
+    CMPIStatus status{};
+    const CMPIData data = getPropertyData(instance, name, status);
+    return deliver(dateTimeTextOf(data, status), value) || deliver(textOf(data, status), value);
+}
+
+bool ProviderUtilities::getProperty(const CMPIInstance* instance, const char* name, unsigned int& value) {
+    CMPIStatus status{};
+    const CMPIData data = getPropertyData(instance, name, status);
+    return deliver(numberOf(data, status), value);
+}
+
+bool ProviderUtilities::getProperty(const CMPIInstance* instance, const char* name, bool& value) {
+    CMPIStatus status{};
+    const CMPIData data = getPropertyData(instance, name, status);
+    return deliver(flagOf(data, status), value);
+}
+
+void ProviderUtilities::transformObjectPathToMoniker(const CMPIObjectPath* path, Moniker& moniker) {
+    CMPIStatus counting{};
+    const CMPICount count = callTable<&CMPIObjectPathFT::getKeyCount>(path, &counting);
+    for (CMPICount index = 0; index < count; ++index) {
+        CMPIStatus status{};
+        CMPIString* nameString = nullptr;
+        const CMPIData data = callTable<&CMPIObjectPathFT::getKeyAt>(path, index, &nameString, &status);
+        const std::optional<std::string> name = textOf(nameString);
+        const std::optional<std::string> value = keyTextOf(data, status);
+        if (name && value) {
+            moniker.addKey(*name, *value);
+        }
+    }
+}
+
+void ProviderUtilities::transformMonikerToObjectPath(Moniker& moniker, CMPIObjectPath** path) {
+    if (path == nullptr) {
+        return;
+    }
+    Moniker cursor = moniker;  // the caller's selection stays as it is
+    std::string name;
+    std::string value;
+    for (unsigned int index = 0; cursor.selectKey(index); ++index) {
+        if (cursor.getName(name) && cursor.getValue(value)) {
+            setKeyProperty(*path, name.c_str(), value);
+        }
+    }
+}
+
+}  // namespace KO

@@ -1,0 +1,107 @@
+#include "framework/ReplacementFile.h"
+
+#include "framework/OpenFile.h"
+
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <cerrno>
+#include <cstdio>
+#include <cstdlib>
+#include <filesystem>
+
+namespace KO {
+
+namespace {
+
+[[noreturn]] void fail(const std::string& path) {
+    throwFileError("Cannot write ", path, errno);
+}
+
+/** A new file beside the one to be replaced; removed again unless it took its place. */
+class TemporaryFile {
+public:
+    explicit TemporaryFile(const std::string& target)
+        : path(target + ".XXXXXX"), file(::mkostemp(path.data(), O_CLOEXEC)) {
+        if (file.get() < 0) {
+            path.clear();
+            fail(target);
+        }
+    }
+    ~TemporaryFile() {
+        if (!path.empty()) {
+            ::unlink(path.c_str());
+        }
+    }
+    TemporaryFile(const TemporaryFile&) = delete;
+    TemporaryFile& operator=(const TemporaryFile&) = delete;
+
+    /** Takes over mode and owner of the file to be replaced, if it is there. */
+    void adoptAttributes(const std::string& target) {
+        struct stat status {};
+        if (::stat(target.c_str(), &status) != 0) {
+            status.st_mode = 0640;
+        } else if (::fchown(file.get(), status.st_uid, status.st_gid) != 0) {
+            // Only the superuser may give a file away; anybody else keeps it as its own.
+        }
+        constexpr mode_t permissions = 07777;
+        if (::fchmod(file.get(), status.st_mode & permissions) != 0) {
+            fail(target);
+        }
+    }
+
+    void write(const std::string& content) {
+        std::size_t written = 0;
+        while (written < content.size()) {
+            const ssize_t count = ::write(file.get(), content.data() + written, content.size() - written);
+            if (count < 0 && errno != EINTR) {
+                fail(path);
+            }
+            written += count > 0 ? static_cast<std::size_t>(count) : 0;
+        }
+        if (::fsync(file.get()) != 0) {
+            fail(path);
+        }
+    }
+
+    void takePlaceOf(const std::string& target) {
+        if (::rename(path.c_str(), target.c_str()) != 0) {
+            fail(target);
+        }
+        path.clear();
+    }
+
+private:
+    std::string path;
+    OpenFile file;
+};
+
+/** The file that a path leads to; the path itself if there is none. */
+std::string followLinks(const std::string& path) {
+    std::error_code error;
+    const std::filesystem::path target = std::filesystem::canonical(path, error);
+    return error ? path : target.string();
+}
+
+/** Forces the renaming to the disk. It has been done either way: a failure is no failure to replace. */
+void syncDirectoryOf(const std::string& path) {
+    const std::string directory = path.find('/') == std::string::npos ? "." : path.substr(0, path.rfind('/') + 1);
+    const OpenFile file(::open(directory.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
+    if (file.get() >= 0) {
+        ::fsync(file.get());
+    }
+}
+
+}  // namespace
+
+void replaceFile(const std::string& path, const std::string& content) {
+    const std::string target = followLinks(path);
+    TemporaryFile file(target);
+    file.adoptAttributes(target);
+    file.write(content);
+    file.takePlaceOf(target);
+    syncDirectoryOf(target);
+}
+
+}  // namespace KO

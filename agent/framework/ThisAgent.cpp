@@ -1,0 +1,58 @@
+#include "framework/ThisAgent.h"
+
+#include "RZLog/RZLogger.h"
+#include "framework/ComputerDiscovery.h"
+
+#include <mutex>
+
+namespace KO {
+
+namespace {
+
+void report(const Agent::Problems& problems) {
+    constexpr int errorLevel = 3000;
+    for (const std::string& problem : problems) {
+        for (const auto write : {&RZLog::RZLogger::logLevelMessage, &RZLog::RZLogger::traceLevelMessage}) {
+            write(__func__, "ThisAgent.cpp", __LINE__, "Ostrel.Agent", errorLevel, nullptr, 0, 0, problem);
+        }
+    }
+}
+
+std::shared_ptr<const ThisAgent> readThisAgent() {
+    Agent::Problems problems;
+    auto agent = std::make_shared<ThisAgent>();
+    agent->settings = readAgentSettings(Agent::Document::readDefault(), problems);
+    if (agent->settings.discover) {
+        agent->tree = discoverComputer(agent->settings.dmiRoot, hostName(), problems);
+    }
+    for (const Node& node : agent->settings.nodes) {
+        agent->tree.put(node);
+    }
+    report(problems);
+    return agent;
+}
+
+// Threads may still ask while the process ends and static objects go: what they touch then is the
+// mutex and the pointer, which need no destruction.
+std::mutex agentMutex;
+std::shared_ptr<const ThisAgent>* agent = nullptr;
+
+struct AgentOwner {
+    ~AgentOwner() {
+        const std::lock_guard<std::mutex> lock(agentMutex);
+        delete agent;
+        agent = nullptr;
+    }
+} agentOwner;
+
+}  // namespace
+
+std::shared_ptr<const ThisAgent> thisAgent() {
+    const std::lock_guard<std::mutex> lock(agentMutex);
+    if (agent == nullptr) {
+        agent = new std::shared_ptr<const ThisAgent>(readThisAgent());
+    }
+    return *agent;
+}
+
+}  // namespace KO

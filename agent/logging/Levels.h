@@ -1,0 +1,50 @@
+#pragma once
+
+#include <array>
+#include <cstddef>
+#include <string_view>
+
+namespace RZLog {
+
+/** The two channels of the log. */
+enum class Channel { Log, Trace };
+
+/** The level up to which each channel takes records. */
+struct ChannelLevels {
+    int log = 3000;
+    int trace = 3000;
+
+    int of(Channel channel) const { return channel == Channel::Log ? log : trace; }
+};
+
+/**
+ * The levels of the loggers. Asking allocates nothing, takes no lock and works as long as the
+ * library is mapped, whatever else of the process has been destroyed: hence the fixed sizes.
+ */
+class Levels {
+public:
+    static constexpr std::size_t mostLoggers = 64;
+    static constexpr std::size_t longestName = 127;
+
+    /** Sets the levels of all loggers that have none of their own. */
+    void setDefault(ChannelLevels levels) { fallback = levels; }
+
+    /** Sets one logger's levels. @return false when there is no room or the name is too long */
+    bool set(std::string_view logger, ChannelLevels levels);
+
+    /** Whether a record of that level is to be written. */
+    bool admit(Channel channel, std::string_view logger, int level) const;
+
+private:
+    struct Entry {
+        std::array<char, longestName + 1> name;
+        std::size_t length;
+        ChannelLevels levels;
+    };
+
+    ChannelLevels fallback;
+    std::array<Entry, mostLoggers> entries{};
+    std::size_t count = 0;
+};
+
+}  // namespace RZLog

@@ -1,0 +1,25 @@
+#pragma once
+
+#include "configuration/Document.h"
+#include "logging/Levels.h"
+
+#include <cstddef>
+#include <string>
+
+namespace RZLog {
+
+/** The [log] table of the agent's configuration. */
+struct LogSettings {
+    enum class Destination { None, File, Syslog, Journal };
+
+    Destination destination = Destination::None;
+    std::string file;                              ///< path of the log file; empty for the other destinations
+    std::size_t rotationSize = 10U * 1024 * 1024;  ///< bytes after which the file is rotated
+    std::size_t rotationCount = 5;                 ///< how many rotated files are kept
+    Levels levels;
+};
+
+/** Reads the [log] table; every value that is absent or wrong has its default. */
+LogSettings readLogSettings(const Agent::Document& document, Agent::Problems& problems);
+
+}  // namespace RZLog

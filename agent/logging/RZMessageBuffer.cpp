@@ -1,0 +1,144 @@
+#include "RZLog/RZMessageBuffer.h"
+
+#include <atomic>
+#include <locale>
+#include <streambuf>
+
+namespace RZLog {
+
+namespace {
+
+/** Appends everything that a stream puts out to a string. */
+class StringAppender : public std::streambuf {
+public:
+    std::string text;
+
+protected:
+    std::streamsize xsputn(const char* characters, std::streamsize count) override {
+        text.append(characters, static_cast<std::size_t>(count));
+        return count;
+    }
+
+    int_type overflow(int_type character) override {
+        if (!traits_type::eq_int_type(character, traits_type::eof())) {
+            text.push_back(traits_type::to_char_type(character));
+        }
+        return traits_type::not_eof(character);
+    }
+};
+
+/**
+ * Implementations waiting for their next buffer. No lock and nothing that a thread would have to
+ * clean up: such a thing would keep the library in the process.
+ */
+template <typename Element, std::size_t size>
+class Pool {
+public:
+    ~Pool() {
+        for (std::atomic<Element*>& place : places) {
+            delete place.exchange(nullptr);
+        }
+    }
+
+    /** @return null when the pool is empty */
+    std::unique_ptr<Element> take() {
+        for (std::atomic<Element*>& place : places) {
+            if (place.load(std::memory_order_relaxed) != nullptr) {
+                if (Element* element = place.exchange(nullptr, std::memory_order_acquire)) {
+                    return std::unique_ptr<Element>(element);
+                }
+            }
+        }
+        return nullptr;
+    }
+
+    /** Keeps an element if there is a place for it. */
+    void give(std::unique_ptr<Element> element) {
+        for (std::atomic<Element*>& place : places) {
+            Element* none = nullptr;
+            if (place.compare_exchange_strong(none, element.get(), std::memory_order_release,
+                                              std::memory_order_relaxed)) {
+                static_cast<void>(element.release());
+                return;
+            }
+        }
+    }
+
+private:
+    std::atomic<Element*> places[size] = {};
+};
+
+}  // namespace
+
+/** A stream is dear to make, and one is needed for every line that is traced: hence the pool. */
+struct RZMessageBuffer::Implementation {
+    StringAppender appender;
+    std::ostream stream{&appender};
+
+    static Pool<Implementation, 16> pool;
+
+    Implementation() { stream.imbue(std::locale::classic()); }
+
+    /** Brings the stream back to the state of a new one, whatever was done to it. */
+    void resetStream() {
+        stream.exceptions(std::ios_base::goodbit);
+        stream.rdbuf(&appender);  // clears the error state too
+        stream.flags(std::ios_base::dec | std::ios_base::skipws);
+        stream.width(0);
+        stream.precision(6);
+        stream.fill(' ');
+        stream.tie(nullptr);
+        if (stream.getloc() != std::locale::classic()) {
+            stream.imbue(std::locale::classic());
+        }
+    }
+
+    void empty() {
+        constexpr std::size_t mostKept = 65536;
+        if (appender.text.capacity() > mostKept) {
+            appender.text = std::string();
+        }
+        appender.text.clear();
+        resetStream();
+    }
+
+    std::string take() {
+        std::string text = appender.text;
+        empty();
+        return text;
+    }
+};
+
+Pool<RZMessageBuffer::Implementation, 16> RZMessageBuffer::Implementation::pool;
+
+RZMessageBuffer::RZMessageBuffer() : implementation(Implementation::pool.take()) {
+    if (implementation == nullptr) {
+        implementation = std::make_unique<Implementation>();
+    }
+}
+
+RZMessageBuffer::~RZMessageBuffer() {
+    implementation->empty();
+    Implementation::pool.give(std::move(implementation));
+}
+
+std::ostream& RZMessageBuffer::operator<<(const char* text) {
+    if (text != nullptr) {
+        implementation->appender.text.append(text);
+    }
+    return implementation->stream;
+}
+
+RZMessageBuffer::operator std::ostream&() {
+    return implementation->stream;
+}
+
+std::string RZMessageBuffer::str(RZMessageBuffer& buffer) {
+    return buffer.implementation->take();
+}
+
+std::string RZMessageBuffer::str(std::ostream& /*stream*/) {
+    return implementation->take();
+}
+
+}  // namespace RZLog

@@ -1,0 +1,99 @@
+#include "logging/Writer.h"
+
+#include "logging/LogSettings.h"
+#include "logging/Sinks.h"
+
+#include <chrono>
+#include <mutex>
+#include <type_traits>
+
+namespace RZLog {
+
+namespace {
+
+constexpr std::chrono::seconds pauseAfterFailure{10};
+
+/** The destination and what it is opened with. */
+struct Output {
+    LogSettings settings;
+    std::unique_ptr<Sink> sink;
+    std::chrono::steady_clock::time_point nextOpening = std::chrono::steady_clock::time_point::min();
+};
+
+// A thread may still log while the process ends and static objects go: what it touches then is the
+// mutex and the pointer, which need no destruction.
+std::mutex outputMutex;
+Output* output = nullptr;
+
+struct OutputOwner {
+    ~OutputOwner() {
+        const std::lock_guard<std::mutex> lock(outputMutex);
+        delete output;
+        output = nullptr;
+    }
+} outputOwner;
+
+Sink* openOutput() {
+    const auto now = std::chrono::steady_clock::now();
+    if (output->sink == nullptr && now >= output->nextOpening) {
+        output->nextOpening = now + pauseAfterFailure;
+        output->sink = openSink(output->settings);
+    }
+    return output->sink.get();
+}
+
+void writeUnlessFailing(const Record& record) noexcept {
+    try {
+        if (Sink* sink = openOutput()) {
+            sink->write(record);
+        }
+    } catch (...) {
+        output->sink.reset();
+    }
+}
+
+void reportProblems(const Agent::Problems& problems, const Levels& levels) {
+    const std::string logger = "Ostrel.Agent";
+    constexpr int level = 3000;
+    for (const std::string& problem : problems) {
+        for (const Channel channel : {Channel::Log, Channel::Trace}) {
+            if (levels.admit(channel, logger, level)) {
+                write({channel, level, logger, "configure", "Writer.cpp", __LINE__, problem});
+            }
+        }
+    }
+}
+
+Levels configure() {
+    Agent::Problems problems;
+    const Agent::Document document = Agent::Document::readDefault();
+    if (!document.problem().empty()) {
+        problems.push_back(document.problem());
+    }
+    auto newOutput = std::make_unique<Output>();
+    newOutput->settings = readLogSettings(document, problems);
+    const Levels levels = newOutput->settings.levels;
+    {
+        const std::lock_guard<std::mutex> lock(outputMutex);
+        output = newOutput.release();
+    }
+    reportProblems(problems, levels);
+    return levels;
+}
+
+}  // namespace
+
+bool admits(Channel channel, std::string_view logger, int level) {
+    static_assert(std::is_trivially_destructible_v<Levels>, "levels are asked for while the process ends");
+    static const Levels levels = configure();
+    return levels.admit(channel, logger, level);
+}
+
+void write(const Record& record) noexcept {
+    const std::lock_guard<std::mutex> lock(outputMutex);
+    if (output != nullptr) {
+        writeUnlessFailing(record);
+    }
+}
+
+}  // namespace RZLog
