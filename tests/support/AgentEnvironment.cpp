@@ -1,0 +1,122 @@
+#include "support/AgentEnvironment.h"
+
+#include <cstdlib>
+#include <fstream>
+#include <sstream>
+#include <stdexcept>
+
+namespace agentEnvironment {
+
+const char* const oneComputer = R"(
+[[instrumentation.node]]
+type = 1
+path = "/system"
+properties = { "36" = "Example Maker", "108" = "testhost" }
+
+[[instrumentation.node]]
+type = 40
+path = "/system/computer"
+properties = { "36" = "Example Maker", "39" = "Model X - Tower", "108" = "testhost" }
+)";
+
+namespace {
+
+namespace fs = std::filesystem;
+
+std::string& root() {
+    static std::string path;
+    return path;
+}
+
+void writeConfiguration(const fs::path& file) {
+    std::ofstream stream(file);
+    stream << "[directories]\ninstall = \"" << installDirectory().string() << "\"\ndata = \""
+           << dataDirectory().string() << "\"\n[product]\nname = \"Test Agent\"\nversion = \"4.2.0\"\n"
+           << "build_number = \"77\"\nidentifying_number = \"ID-1\"\nvendor = \"VEL\"\n"
+           << "[log]\ndestination = \"" << logFile().string() << "\"\nlog_level = 9999\ntrace_level = 9999\n"
+           << "[instrumentation]\ndiscover = false\n"
+           << agentNodes;
+}
+
+/** Comes before all other static initialisation: the record tables are loaded in it. */
+__attribute__((constructor(101))) void setUp() {
+    std::string pattern = (fs::temp_directory_path() / "agent-XXXXXX").string();
+    if (mkdtemp(pattern.data()) == nullptr) {
+        throw std::runtime_error("cannot make a directory for the test's agent");
+    }
+    root() = pattern;
+    fs::create_directory(dataDirectory());
+    fs::create_directory(installDirectory());
+    const fs::path configuration = directory() / "agent.toml";
+    writeConfiguration(configuration);
+    setenv("OSTREL_CONFIG", configuration.c_str(), 1);
+}
+
+__attribute__((destructor(101))) void tearDown() {
+    std::error_code ignored;
+    fs::permissions(dataDirectory(), fs::perms::owner_all, ignored);
+    fs::remove_all(directory(), ignored);
+}
+
+LogRecord parse(const std::string& line) {
+    std::istringstream fields(line);
+    LogRecord record;
+    std::string time;
+    std::string level;
+    std::string number;
+    std::getline(fields, time, '\t');
+    std::getline(fields, record.channel, '\t');
+    std::getline(fields, level, '\t');
+    std::getline(fields, record.logger, '\t');
+    std::getline(fields, record.function, '\t');
+    std::getline(fields, record.file, '\t');
+    std::getline(fields, number, '\t');
+    std::getline(fields, record.text);
+    record.level = std::stoi(level);
+    record.line = std::stoi(number);
+    return record;
+}
+
+}  // namespace
+
+fs::path directory() {
+    return root();
+}
+
+fs::path dataDirectory() {
+    return directory() / "data";
+}
+
+fs::path installDirectory() {
+    return directory() / "install";
+}
+
+fs::path logFile() {
+    return directory() / "agent.log";
+}
+
+void clear() {
+    fs::create_directories(dataDirectory());
+    fs::permissions(dataDirectory(), fs::perms::owner_all);
+    for (const auto& entry : fs::directory_iterator(dataDirectory())) {
+        fs::remove_all(entry);
+    }
+    forgetLog();
+}
+
+std::vector<LogRecord> log() {
+    std::ifstream stream(logFile());
+    std::vector<LogRecord> records;
+    for (std::string line; std::getline(stream, line);) {
+        records.push_back(parse(line));
+    }
+    return records;
+}
+
+void forgetLog() {
+    if (fs::exists(logFile())) {
+        fs::resize_file(logFile(), 0);
+    }
+}
+
+}  // namespace agentEnvironment
