@@ -23,8 +23,9 @@ namespace {
 
 namespace fs = std::filesystem;
 
+/** Never destroyed: it is needed after all static objects are gone. */
 std::string& root() {
-    static std::string path;
+    static std::string& path = *new std::string;
     return path;
 }
 
