@@ -1,0 +1,123 @@
+#include "broker/Broker.h"
+
+#include <algorithm>
+#include <iterator>
+#include <utility>
+#include <vector>
+
+#include "broker/Boundary.h"
+
+namespace cimhost {
+namespace {
+
+/** An arena that a thread makes objects in. */
+struct Scope {
+    const Broker* broker;
+    Arena* arena;
+};
+
+/** The scopes of this thread, the innermost last. */
+std::vector<Scope>& scopes() {
+    thread_local std::vector<Scope> ofThread;
+    return ofThread;
+}
+
+UpCalls& noUpCalls() {
+    static UpCalls none;
+    return none;
+}
+
+BrokerOptions completed(BrokerOptions options) {
+    if (options.tables == nullptr) {
+        options.tables = &standardTables();
+    }
+    if (options.upCalls == nullptr) {
+        options.upCalls = &noUpCalls();
+    }
+    return options;
+}
+
+/** The standard's broker points to tables without const; nobody writes to them. */
+CMPIBroker handleOf(Broker& broker, const FunctionTables& tables) {
+    auto& plain = const_cast<FunctionTables&>(tables);
+    return {&broker, &plain.broker, &plain.encapsulation, &plain.threads, &plain.memory};
+}
+
+}  // namespace
+
+Broker::Broker(BrokerOptions itsOptions)
+    : options(completed(std::move(itsOptions))), brokerHandle(handleOf(*this, *options.tables)), outside(tables()) {}
+
+Broker::~Broker() = default;
+
+Broker& Broker::of(const CMPIBroker* handle) {
+    if (handle == nullptr || handle->hdl == nullptr) {
+        throw Failure(CMPI_RC_ERR_INVALID_HANDLE);
+    }
+    return *static_cast<Broker*>(handle->hdl);
+}
+
+std::shared_ptr<const ClassShape> Broker::classShape(const std::string& className) const {
+    return options.classShape ? options.classShape(className) : nullptr;
+}
+
+void Broker::log(const LogRecord& record) const {
+    if (options.log) {
+        options.log(record);
+    }
+}
+
+Arena& Broker::arena() {
+    const auto& all = scopes();
+    const auto found =
+        std::find_if(all.rbegin(), all.rend(), [this](const Scope& scope) { return scope.broker == this; });
+    return found == all.rend() ? outside : *found->arena;
+}
+
+Arena* Broker::arenaOfThread() {
+    return scopes().empty() ? nullptr : scopes().back().arena;
+}
+
+void Broker::enter(Arena& arena) {
+    scopes().push_back({this, &arena});
+}
+
+void Broker::leave(const Arena& arena) {
+    auto& all = scopes();
+    const auto found =
+        std::find_if(all.rbegin(), all.rend(), [&](const Scope& scope) { return scope.arena == &arena; });
+    if (found != all.rend()) {
+        all.erase(std::next(found).base());
+    }
+}
+
+CMPIContext* Broker::prepareThread(const ContextEntries& entries) {
+    auto arena = std::make_unique<Arena>(tables());
+    auto* context = arena->make<CMPIContext>({entries});
+    const std::lock_guard<std::mutex> lock(mutex);
+    threads.emplace(context, std::move(arena));
+    return context;
+}
+
+bool Broker::attachThread(const CMPIContext* context) {
+    const std::lock_guard<std::mutex> lock(mutex);
+    const auto found = threads.find(context);
+    if (found == threads.end()) {
+        return false;
+    }
+    enter(*found->second);
+    return true;
+}
+
+bool Broker::detachThread(const CMPIContext* context) {
+    const std::lock_guard<std::mutex> lock(mutex);
+    const auto found = threads.find(context);
+    if (found == threads.end()) {
+        return false;
+    }
+    leave(*found->second);
+    threads.erase(found);
+    return true;
+}
+
+}  // namespace cimhost

@@ -1,0 +1,195 @@
+#include "broker/Convert.h"
+
+#include <algorithm>
+#include <iterator>
+#include <tuple>
+#include <type_traits>
+
+#include "broker/Boundary.h"
+
+namespace cimhost {
+namespace {
+
+/** A plain type: its number, and the alternative of Scalar and the member of CMPIValue that carry it. */
+template <class Alternative, class Member>
+struct PlainType {
+    CMPIType type;
+    Member CMPIValue::*member;
+
+    Scalar read(const CMPIValue& value) const { return Alternative{static_cast<Alternative>(value.*member)}; }
+    void write(const Alternative& plain, CMPIValue& value) const { value.*member = static_cast<Member>(plain); }
+    static bool carries(const Scalar& scalar) { return std::holds_alternative<Alternative>(scalar); }
+    void writeFrom(const Scalar& scalar, CMPIValue& value) const { write(std::get<Alternative>(scalar), value); }
+};
+
+template <>
+struct PlainType<Char16, CMPIChar16> {
+    CMPIType type;
+    CMPIChar16 CMPIValue::*member;
+
+    Scalar read(const CMPIValue& value) const { return Char16{value.*member}; }
+    static bool carries(const Scalar& scalar) { return std::holds_alternative<Char16>(scalar); }
+    void writeFrom(const Scalar& scalar, CMPIValue& value) const { value.*member = std::get<Char16>(scalar).code; }
+};
+
+template <class Alternative, class Member>
+constexpr PlainType<Alternative, Member> plain(CMPIType type, Member CMPIValue::*member) {
+    return {type, member};
+}
+
+constexpr auto plainTypes = std::make_tuple(
+    plain<bool>(CMPI_boolean, &CMPIValue::boolean), plain<Char16>(CMPI_char16, &CMPIValue::char16),
+    plain<std::uint8_t>(CMPI_uint8, &CMPIValue::uint8), plain<std::uint16_t>(CMPI_uint16, &CMPIValue::uint16),
+    plain<std::uint32_t>(CMPI_uint32, &CMPIValue::uint32), plain<std::uint64_t>(CMPI_uint64, &CMPIValue::uint64),
+    plain<std::int8_t>(CMPI_sint8, &CMPIValue::sint8), plain<std::int16_t>(CMPI_sint16, &CMPIValue::sint16),
+    plain<std::int32_t>(CMPI_sint32, &CMPIValue::sint32), plain<std::int64_t>(CMPI_sint64, &CMPIValue::sint64),
+    plain<float>(CMPI_real32, &CMPIValue::real32), plain<double>(CMPI_real64, &CMPIValue::real64));
+
+/** Calls the action with each plain type until one answers true; whether one did. */
+template <class Action>
+bool anyPlainType(Action action) {
+    return std::apply([&](const auto&... each) { return (action(each) || ...); }, plainTypes);
+}
+
+Scalar readEncapsulated(const CMPIValue& value, CMPIType type) {
+    switch (type) {
+        case CMPI_string:
+            return argument(value.string);
+        case CMPI_dateTime:
+            return argument(value.dateTime);
+        case CMPI_ref:
+            return std::make_shared<const ObjectPath>(argument(value.ref));
+        case CMPI_instance:
+            return std::make_shared<const Instance>(argument(value.inst).value);
+        default:
+            throw Failure(CMPI_RC_ERR_INVALID_DATA_TYPE);
+    }
+}
+
+/** Whether a value of this type is a pointer, which may be null. */
+bool isEncapsulated(CMPIType type) {
+    return (type & CMPI_ENC) != 0;
+}
+
+/** Writes what is not a plain type. */
+struct EncapsulatedWriter {
+    CMPIValue& value;
+    Arena& arena;
+
+    void operator()(const std::string& text) const { value.string = arena.make<CMPIString>(text); }
+    void operator()(const DateTime& time) const { value.dateTime = arena.make<CMPIDateTime>(time); }
+    void operator()(const std::shared_ptr<const ObjectPath>& path) const {
+        value.ref = arena.make<CMPIObjectPath>(*path);
+    }
+    void operator()(const std::shared_ptr<const Instance>& instance) const {
+        value.inst = arena.make<CMPIInstance>({*instance, nullptr, {}});
+    }
+    template <class Plain>
+    void operator()(const Plain&) const {}
+};
+
+CMPIData nullData(CMPIType type) {
+    CMPIData data{};
+    data.type = type;
+    data.state = CMPI_nullValue;
+    return data;
+}
+
+Value arrayFrom(const CMPIArray* array, CMPIType type) {
+    Value result{type, true, array == nullptr, {}};
+    if (array != nullptr) {
+        const ArrayContent& content = argument(array);
+        if (content.type != type) {
+            throw Failure(CMPI_RC_ERR_TYPE_MISMATCH);
+        }
+        result.elements = content.elements;
+    }
+    return result;
+}
+
+}  // namespace
+
+CMPIType elementType(CMPIType type) {
+    const auto element = static_cast<CMPIType>(type & ~CMPI_ARRAY);
+    if (element == CMPI_chars) {
+        return CMPI_string;
+    }
+    const bool isKnown = element == CMPI_string || element == CMPI_dateTime || element == CMPI_ref ||
+                         element == CMPI_instance ||
+                         anyPlainType([&](const auto& each) { return each.type == element; });
+    if (!isKnown) {
+        throw Failure(CMPI_RC_ERR_INVALID_DATA_TYPE);
+    }
+    return element;
+}
+
+Scalar scalarFrom(const CMPIValue* value, CMPIType type) {
+    if (value == nullptr || type == CMPI_null) {
+        return std::monostate{};
+    }
+    if (type == CMPI_chars) {
+        return std::string(reinterpret_cast<const char*>(value));
+    }
+    if (isEncapsulated(type)) {
+        return value->string == nullptr ? Scalar{} : readEncapsulated(*value, type);
+    }
+    Scalar scalar;
+    const bool found = anyPlainType([&](const auto& each) {
+        const bool matches = each.type == type;
+        scalar = matches ? each.read(*value) : Scalar{};
+        return matches;
+    });
+    if (!found) {
+        throw Failure(CMPI_RC_ERR_INVALID_DATA_TYPE);
+    }
+    return scalar;
+}
+
+Value valueFrom(const CMPIValue* value, CMPIType type) {
+    if (type == CMPI_null) {
+        return {};
+    }
+    const CMPIType element = elementType(type);
+    if ((type & CMPI_ARRAY) != 0) {
+        return arrayFrom(value == nullptr ? nullptr : value->array, element);
+    }
+    Scalar scalar = scalarFrom(value, type);
+    if (std::holds_alternative<std::monostate>(scalar)) {
+        return {element, false, true, {}};
+    }
+    return {element, false, false, {std::move(scalar)}};
+}
+
+CMPIData dataFrom(const Scalar& scalar, CMPIType type, Arena& arena) {
+    CMPIData data = nullData(type);
+    if (std::holds_alternative<std::monostate>(scalar)) {
+        return data;
+    }
+    data.state = CMPI_goodValue;
+    const bool isPlain = anyPlainType([&](const auto& each) {
+        const bool carries = each.carries(scalar);
+        if (carries) {
+            each.writeFrom(scalar, data.value);
+        }
+        return carries;
+    });
+    if (!isPlain) {
+        std::visit(EncapsulatedWriter{data.value, arena}, scalar);
+    }
+    return data;
+}
+
+CMPIData dataFrom(const Value& value, Arena& arena) {
+    if (value.isArray) {
+        CMPIData data = nullData(static_cast<CMPIType>(value.type | CMPI_ARRAY));
+        if (!value.isNull) {
+            data.state = CMPI_goodValue;
+            data.value.array = arena.make<CMPIArray>({value.type, value.elements});
+        }
+        return data;
+    }
+    return value.isNull || value.elements.empty() ? nullData(value.type)
+                                                  : dataFrom(value.elements.front(), value.type, arena);
+}
+
+}  // namespace cimhost

@@ -1,0 +1,249 @@
+#include <algorithm>
+#include <cstring>
+
+#include "broker/Boundary.h"
+#include "broker/Broker.h"
+#include "broker/Convert.h"
+#include "broker/DateTimes.h"
+#include "broker/Messages.h"
+#include "broker/NamedValues.h"
+#include "broker/Tables.h"
+#include "broker/ToText.h"
+#include "schema/Names.h"
+#include "schema/Text.h"
+
+// CMPIBrokerEncFT: making encapsulated objects, and services around them.
+
+namespace cimhost {
+namespace {
+
+/** The arena for a new object. Failure when the handle is no broker's. */
+Arena& arenaOf(const CMPIBroker* broker) {
+    return Broker::of(broker).arena();
+}
+
+/** The keys of the path that are properties of the class, with their values. */
+std::vector<NamedValue> keyProperties(const ObjectPath& path, const ClassShape& shape) {
+    std::vector<NamedValue> properties;
+    for (const PropertyShape& property : shape.properties) {
+        const NamedValue* key = property.isKey ? findNamed(path.keys, property.name) : nullptr;
+        if (key != nullptr) {
+            properties.push_back({property.name, key->value});
+        }
+    }
+    return properties;
+}
+
+/** An instance of a class that is known begins with its keys, any other without properties. */
+CMPIInstance* newInstance(const CMPIBroker* broker, const CMPIObjectPath* path, CMPIStatus* rc) {
+    return guarded<CMPIInstance*>(rc, nullptr, [&] {
+        Broker& owner = Broker::of(broker);
+        InstanceContent content;
+        content.value.path = argument(path);
+        content.shape = owner.classShape(content.value.path.className);
+        if (content.shape) {
+            content.value.properties = keyProperties(content.value.path, *content.shape);
+        }
+        return owner.arena().make<CMPIInstance>(std::move(content));
+    });
+}
+
+CMPIObjectPath* newObjectPath(const CMPIBroker* broker, const char* nameSpace, const char* className, CMPIStatus* rc) {
+    return guarded<CMPIObjectPath*>(rc, nullptr, [&] {
+        ObjectPath path;
+        path.nameSpace = nameSpace == nullptr ? "" : nameSpace;
+        path.className = argument(className);
+        return arenaOf(broker).make<CMPIObjectPath>(std::move(path));
+    });
+}
+
+CMPIArgs* newArgs(const CMPIBroker* broker, CMPIStatus* rc) {
+    return guarded<CMPIArgs*>(rc, nullptr, [&] { return arenaOf(broker).make<CMPIArgs>({}); });
+}
+
+CMPIString* newString(const CMPIBroker* broker, const char* text, CMPIStatus* rc) {
+    return guarded<CMPIString*>(rc, nullptr, [&] { return arenaOf(broker).make<CMPIString>(argument(text)); });
+}
+
+CMPIArray* newArray(const CMPIBroker* broker, CMPICount size, CMPIType type, CMPIStatus* rc) {
+    return guarded<CMPIArray*>(rc, nullptr, [&] {
+        if ((type & CMPI_ARRAY) != 0) {
+            throw Failure(CMPI_RC_ERR_INVALID_DATA_TYPE);
+        }
+        return arenaOf(broker).make<CMPIArray>({elementType(type), std::vector<Scalar>(size)});
+    });
+}
+
+CMPIDateTime* newDateTime(const CMPIBroker* broker, CMPIStatus* rc) {
+    return guarded<CMPIDateTime*>(rc, nullptr, [&] { return arenaOf(broker).make<CMPIDateTime>({currentTimeText()}); });
+}
+
+CMPIDateTime* newDateTimeFromBinary(const CMPIBroker* broker, CMPIUint64 microseconds, CMPIBoolean interval,
+                                    CMPIStatus* rc) {
+    return guarded<CMPIDateTime*>(rc, nullptr, [&] {
+        const std::optional<std::string> text =
+            interval != 0 ? intervalText(microseconds) : timeText(static_cast<std::int64_t>(microseconds));
+        if (!text) {
+            throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "The time is out of range.");
+        }
+        return arenaOf(broker).make<CMPIDateTime>({*text});
+    });
+}
+
+CMPIDateTime* newDateTimeFromChars(const CMPIBroker* broker, const char* text, CMPIStatus* rc) {
+    return guarded<CMPIDateTime*>(rc, nullptr, [&] {
+        Arena& arena = arenaOf(broker);
+        const std::string time = argument(text);
+        if (!isDateTime(time)) {
+            throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "'" + time + "' is no CIM datetime.");
+        }
+        return arena.make<CMPIDateTime>({time});
+    });
+}
+
+/** Queries are not supported, so nobody ever has a CMPISelectExp. */
+CMPISelectExp* newSelectExp(const CMPIBroker* broker, const char*, const char*, CMPIArray** projection,
+                            CMPIStatus* rc) {
+    return guarded<CMPISelectExp*>(rc, nullptr, [&]() -> CMPISelectExp* {
+        Broker::of(broker);
+        if (projection != nullptr) {
+            *projection = nullptr;
+        }
+        throw Failure(CMPI_RC_ERR_NOT_SUPPORTED, "Queries are not supported by this object manager.");
+    });
+}
+
+CMPIBoolean classPathIsA(const CMPIBroker* broker, const CMPIObjectPath* path, const char* className, CMPIStatus* rc) {
+    return guarded<CMPIBoolean>(rc, 0, [&]() -> CMPIBoolean {
+        const Broker& owner = Broker::of(broker);
+        const std::string& own = argument(path).className;
+        const std::string ancestor = argument(className);
+        if (sameName(own, ancestor)) {
+            return 1;
+        }
+        const auto shape = owner.classShape(own);
+        const bool descends = shape && std::any_of(shape->superclasses.begin(), shape->superclasses.end(),
+                                                   [&](const std::string& each) { return sameName(each, ancestor); });
+        return descends ? 1 : 0;
+    });
+}
+
+/** The broker's side of an encapsulated object of any type: every handle begins with the pointer to it. */
+const Object& anyObject(const CMPIBroker* broker, const void* handle) {
+    Broker::of(broker);
+    const void* object = nullptr;
+    if (handle != nullptr) {
+        std::memcpy(&object, handle, sizeof object);
+    }
+    if (object == nullptr) {
+        throw Failure(CMPI_RC_ERR_INVALID_HANDLE);
+    }
+    return *static_cast<const Object*>(object);
+}
+
+CMPIString* toString(const CMPIBroker* broker, const void* object, CMPIStatus* rc) {
+    return guarded<CMPIString*>(rc, nullptr,
+                                [&] { return arenaOf(broker).make<CMPIString>(toText(anyObject(broker, object))); });
+}
+
+CMPIBoolean isOfType(const CMPIBroker* broker, const void* object, const char* type, CMPIStatus* rc) {
+    return guarded<CMPIBoolean>(rc, 0, [&] {
+        const bool matches = argument(type) == typeText(anyObject(broker, object).kind());
+        return static_cast<CMPIBoolean>(matches ? 1 : 0);
+    });
+}
+
+CMPIString* getType(const CMPIBroker* broker, const void* object, CMPIStatus* rc) {
+    return guarded<CMPIString*>(
+        rc, nullptr, [&] { return arenaOf(broker).make<CMPIString>(typeText(anyObject(broker, object).kind())); });
+}
+
+CMPIStatus record(const CMPIBroker* broker, LogRecord record, const char* component, const char* text,
+                  const CMPIString* string) {
+    return guarded([&] {
+        const Broker& owner = Broker::of(broker);
+        record.component = component == nullptr ? "" : component;
+        if (text != nullptr) {
+            record.text = text;
+        } else if (string != nullptr) {
+            record.text = content(string);
+        }
+        owner.log(record);
+    });
+}
+
+CMPIStatus logMessage(const CMPIBroker* broker, int severity, const char* id, const char* text,
+                      const CMPIString* string) {
+    return record(broker, {false, severity, {}, {}}, id, text, string);
+}
+
+CMPIStatus trace(const CMPIBroker* broker, int level, const char* component, const char* text,
+                 const CMPIString* string) {
+    return record(broker, {true, level, {}, {}}, component, text, string);
+}
+
+std::optional<std::string> optionalText(const char* text) {
+    return text == nullptr ? std::nullopt : std::optional<std::string>(text);
+}
+
+CMPIError* newCMPIError(const CMPIBroker* broker, const char* owner, const char* id, const char* message,
+                        const CMPIErrorSeverity severity, const CMPIErrorProbableCause cause, const CMPIrc code,
+                        CMPIStatus* rc) {
+    return guarded<CMPIError*>(rc, nullptr, [&] {
+        ErrorInfo error;
+        error.owningEntity = optionalText(owner);
+        error.messageId = optionalText(id);
+        error.message = optionalText(message);
+        error.severity = severity;
+        error.probableCause = cause;
+        error.statusCode = code;
+        return arenaOf(broker).make<CMPIError>(std::move(error));
+    });
+}
+
+/** There are no message files: providers fall back to their default texts. */
+CMPIStatus openMessageFile(const CMPIBroker* broker, const char*, CMPIMsgFileHandle* file) {
+    return guarded([&] {
+        Broker::of(broker);
+        if (file == nullptr) {
+            throw Failure(CMPI_RC_ERR_INVALID_PARAMETER);
+        }
+        *file = nullptr;
+        throw Failure(CMPI_RC_ERR_NOT_FOUND);
+    });
+}
+
+CMPIStatus closeMessageFile(const CMPIBroker* broker, const CMPIMsgFileHandle file) {
+    return guarded([&] {
+        Broker::of(broker);
+        if (file != nullptr) {
+            throw Failure(CMPI_RC_ERR_INVALID_HANDLE);
+        }
+    });
+}
+
+}  // namespace
+
+const CMPIBrokerEncFT encapsulationTable{tableVersion,
+                                         newInstance,
+                                         newObjectPath,
+                                         newArgs,
+                                         newString,
+                                         newArray,
+                                         newDateTime,
+                                         newDateTimeFromBinary,
+                                         newDateTimeFromChars,
+                                         newSelectExp,
+                                         classPathIsA,
+                                         toString,
+                                         isOfType,
+                                         getType,
+                                         getMessage,
+                                         logMessage,
+                                         trace,
+                                         newCMPIError,
+                                         openMessageFile,
+                                         closeMessageFile,
+                                         getMessage2};
+
+}  // namespace cimhost

@@ -1,0 +1,134 @@
+#include <algorithm>
+
+#include "broker/Convert.h"
+#include "broker/Encapsulation.h"
+#include "broker/NamedValues.h"
+#include "broker/PropertyLists.h"
+#include "broker/Tables.h"
+#include "schema/Names.h"
+
+namespace cimhost {
+namespace {
+
+const PropertyShape* findProperty(const ClassShape& shape, const std::string& name) {
+    const auto found = std::find_if(shape.properties.begin(), shape.properties.end(),
+                                    [&](const PropertyShape& each) { return sameName(each.name, name); });
+    return found == shape.properties.end() ? nullptr : &*found;
+}
+
+bool isKey(const InstanceContent& instance, const std::string& name) {
+    const PropertyShape* shape = instance.shape ? findProperty(*instance.shape, name) : nullptr;
+    return shape != nullptr ? shape->isKey : findNamed(instance.value.path.keys, name) != nullptr;
+}
+
+/** Whether the property filter lets the property through. Keys always pass: without them an instance is nameless. */
+bool accepts(const InstanceContent& instance, const std::string& name) {
+    const PropertyList& list = instance.accepted;
+    return !list || isKey(instance, name) ||
+           std::any_of(list->begin(), list->end(), [&](const std::string& each) { return sameName(each, name); });
+}
+
+/** Failure when the class is known and has no such property, or has it with another type. */
+void checkAgainstClass(const ClassShape* shape, const std::string& name, const Value& value) {
+    if (shape == nullptr) {
+        return;
+    }
+    const PropertyShape* property = findProperty(*shape, name);
+    if (property == nullptr) {
+        throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY, shape->name + " has no property " + name + ".");
+    }
+    const bool isUntypedNull = value.isNull && value.type == CMPI_null;
+    if (!isUntypedNull && (value.type != property->type || value.isArray != property->isArray)) {
+        throw Failure(CMPI_RC_ERR_TYPE_MISMATCH, shape->name + "." + name + " has another type.");
+    }
+}
+
+CMPIStatus setProperty(const CMPIInstance* instance, const char* name, const CMPIValue* value, CMPIType type) {
+    return guarded([&] {
+        InstanceContent& target = content(instance);
+        const std::string property = argument(name);
+        if (property.empty()) {
+            throw Failure(CMPI_RC_ERR_INVALID_PARAMETER);
+        }
+        Value converted = valueFrom(value, type);
+        checkAgainstClass(target.shape.get(), property, converted);
+        if (accepts(target, property)) {
+            setNamed(target.value.properties, property, std::move(converted));
+        }
+    });
+}
+
+CMPIStatus setPropertyWithOrigin(const CMPIInstance* instance, const char* name, const CMPIValue* value,
+                                 const CMPIType type, const char*) {
+    return setProperty(instance, name, value, type);  // origins are the class model's, not kept with values
+}
+
+CMPIData asProperty(CMPIData data, const InstanceContent& instance, const std::string& name) {
+    if (isKey(instance, name)) {
+        data.state = static_cast<CMPIValueState>(data.state | CMPI_keyValue);
+    }
+    return data;
+}
+
+CMPIData getProperty(const CMPIInstance* instance, const char* name, CMPIStatus* rc) {
+    return guarded(rc, badData(), [&] {
+        const auto& object = self(instance);
+        const CMPIData data = namedData(object.content->value.properties, name, object.arena());
+        return asProperty(data, *object.content, name);
+    });
+}
+
+CMPIData getPropertyAt(const CMPIInstance* instance, CMPICount index, CMPIString** name, CMPIStatus* rc) {
+    return guarded(rc, badData(), [&] {
+        const auto& object = self(instance);
+        const auto& properties = object.content->value.properties;
+        const CMPIData data = namedDataAt(properties, index, name, object.arena());
+        return asProperty(data, *object.content, properties[index].name);
+    });
+}
+
+CMPICount getPropertyCount(const CMPIInstance* instance, CMPIStatus* rc) {
+    return guarded<CMPICount>(rc, 0, [&] { return static_cast<CMPICount>(content(instance).value.properties.size()); });
+}
+
+CMPIObjectPath* getObjectPath(const CMPIInstance* instance, CMPIStatus* rc) {
+    return guarded<CMPIObjectPath*>(rc, nullptr, [&] {
+        const auto& object = self(instance);
+        return object.arena().make<CMPIObjectPath>(object.content->value.path);
+    });
+}
+
+CMPIStatus setObjectPath(CMPIInstance* instance, const CMPIObjectPath* path) {
+    return guarded([&] {
+        InstanceContent& target = content(instance);
+        target.value.path = argument(path);
+    });
+}
+
+/** The list of keys is ignored, as the standard allows: the broker knows them. */
+CMPIStatus setPropertyFilter(CMPIInstance* instance, const char** properties, const char**) {
+    return guarded([&] {
+        InstanceContent& target = content(instance);
+        target.accepted = propertyListFrom(properties);
+        auto& values = target.value.properties;
+        values.erase(std::remove_if(values.begin(), values.end(),
+                                    [&](const NamedValue& each) { return !accepts(target, each.name); }),
+                     values.end());
+    });
+}
+
+}  // namespace
+
+const CMPIInstanceFT instanceTable{tableVersion,
+                                   releaseObject<CMPIInstance>,
+                                   cloneObject<CMPIInstance>,
+                                   getProperty,
+                                   getPropertyAt,
+                                   getPropertyCount,
+                                   setProperty,
+                                   getObjectPath,
+                                   setPropertyFilter,
+                                   setObjectPath,
+                                   setPropertyWithOrigin};
+
+}  // namespace cimhost

@@ -1,0 +1,80 @@
+#include <cstring>
+
+#include "broker/Boundary.h"
+#include "broker/Broker.h"
+#include "broker/Tables.h"
+
+// CMPIBrokerMemFT: marks, plain memory, and freeing objects before their request ends.
+
+namespace cimhost {
+namespace {
+
+CMPIGcStat* mark(const CMPIBroker* broker, CMPIStatus* rc) {
+    // The standard's marks are pointers without const; the provider only hands them back.
+    return guarded<CMPIGcStat*>(rc, nullptr,
+                                [&] { return const_cast<CMPIGcStat*>(Broker::of(broker).arena().mark()); });
+}
+
+CMPIStatus release(const CMPIBroker* broker, const CMPIGcStat* marked) {
+    return guarded([&] {
+        if (!Broker::of(broker).arena().releaseMark(marked)) {
+            throw Failure(CMPI_RC_ERR_FAILED, "That is no mark of this request.");
+        }
+    });
+}
+
+void* cmpiCalloc(const CMPIBroker* broker, size_t count, size_t size) {
+    return guarded<void*>(nullptr, nullptr, [&] { return Broker::of(broker).memory().allocate(count, size); });
+}
+
+void* cmpiMalloc(const CMPIBroker* broker, size_t size) {
+    return cmpiCalloc(broker, 1, size);
+}
+
+void* cmpiRealloc(const CMPIBroker* broker, void* block, size_t size) {
+    return guarded<void*>(nullptr, nullptr, [&] { return Broker::of(broker).memory().resize(block, size); });
+}
+
+char* cmpiStrDup(const CMPIBroker* broker, const char* text) {
+    if (text == nullptr) {
+        return nullptr;
+    }
+    const size_t size = std::strlen(text) + 1;
+    void* copy = cmpiMalloc(broker, size);
+    return copy == nullptr ? nullptr : static_cast<char*>(std::memcpy(copy, text, size));
+}
+
+void cmpiFree(const CMPIBroker* broker, void* block) {
+    guarded([&] { Broker::of(broker).memory().free(block); });
+}
+
+template <class Handle>
+void freeObject(const CMPIBroker* broker, Handle* handle) {
+    guarded([&] {
+        Broker::of(broker);
+        self(handle).release();
+    });
+}
+
+/** Nobody has one: queries are not supported. */
+void freeSelectExp(const CMPIBroker*, CMPISelectExp*) {}
+
+}  // namespace
+
+const CMPIBrokerMemFT memoryTable{tableVersion,
+                                  mark,
+                                  release,
+                                  cmpiMalloc,
+                                  cmpiCalloc,
+                                  cmpiRealloc,
+                                  cmpiStrDup,
+                                  cmpiFree,
+                                  freeObject<CMPIInstance>,
+                                  freeObject<CMPIObjectPath>,
+                                  freeObject<CMPIArgs>,
+                                  freeObject<CMPIString>,
+                                  freeObject<CMPIArray>,
+                                  freeObject<CMPIDateTime>,
+                                  freeSelectExp};
+
+}  // namespace cimhost

@@ -1,0 +1,97 @@
+#include "broker/Messages.h"
+
+#include <cstdarg>
+#include <string>
+#include <vector>
+
+#include "broker/Boundary.h"
+#include "broker/Broker.h"
+
+namespace cimhost {
+namespace {
+
+constexpr CMPICount mostInserts = 10;
+
+/** The next insert of the list as text. Failure with CMPI_RC_ERR_TYPE_MISMATCH for any other type. */
+std::string nextInsert(va_list inserts) {
+    switch (va_arg(inserts, int)) {
+        case CMPI_sint32:
+            return std::to_string(va_arg(inserts, CMPISint32));
+        case CMPI_uint32:
+            return std::to_string(va_arg(inserts, CMPIUint32));
+        case CMPI_sint64:
+            return std::to_string(va_arg(inserts, CMPISint64));
+        case CMPI_uint64:
+            return std::to_string(va_arg(inserts, CMPIUint64));
+        case CMPI_real64:
+            return std::to_string(va_arg(inserts, CMPIReal64));
+        case CMPI_boolean:
+            return va_arg(inserts, int) != 0 ? "true" : "false";
+        case CMPI_chars:
+            return argument(va_arg(inserts, const char*));
+        case CMPI_string:
+            return argument(va_arg(inserts, const CMPIString*));
+        default:
+            throw Failure(CMPI_RC_ERR_TYPE_MISMATCH);
+    }
+}
+
+/** The template with its inserts; triggers without an insert stay. */
+std::string expanded(const std::string& text, const std::vector<std::string>& inserts) {
+    std::string result;
+    for (std::size_t i = 0; i < text.size(); ++i) {
+        const bool isTrigger = text[i] == '$' && i + 1 < text.size() && text[i + 1] >= '0' && text[i + 1] <= '9';
+        const std::size_t index = isTrigger ? static_cast<std::size_t>(text[i + 1] - '0') : inserts.size();
+        if (index < inserts.size()) {
+            result += inserts[index];
+            ++i;
+        } else {
+            result += text[i];
+        }
+    }
+    return result;
+}
+
+std::string message(const char* text, CMPICount count, va_list list) {
+    const std::string unexpanded = argument(text);
+    if (count > mostInserts) {
+        throw Failure(CMPI_RC_ERR_INVALID_PARAMETER);
+    }
+    std::vector<std::string> inserts;
+    while (inserts.size() < count) {
+        inserts.push_back(nextInsert(list));
+    }
+    return expanded(unexpanded, inserts);
+}
+
+CMPIString* newMessage(const CMPIBroker* broker, const char* text, CMPIStatus* rc, CMPICount count, va_list list) {
+    CMPIString* result = guarded<CMPIString*>(
+        rc, nullptr, [&] { return Broker::of(broker).arena().make<CMPIString>(message(text, count, list)); });
+    if (result == nullptr && text != nullptr) {
+        result =
+            guarded<CMPIString*>(nullptr, nullptr, [&] { return Broker::of(broker).arena().make<CMPIString>(text); });
+    }
+    return result;
+}
+
+}  // namespace
+
+CMPIString* getMessage(const CMPIBroker* broker, const char*, const char* defaultTemplate, CMPIStatus* rc,
+                       CMPICount count, ...) {
+    va_list list;
+    va_start(list, count);
+    CMPIString* result = newMessage(broker, defaultTemplate, rc, count, list);
+    va_end(list);
+    return result;
+}
+
+CMPIString* getMessage2(const CMPIBroker* broker, const char*, const CMPIMsgFileHandle, const char* defaultTemplate,
+                        CMPIStatus* rc, CMPICount count, ...) {
+    va_list list;
+    va_start(list, count);
+    CMPIString* result = newMessage(broker, defaultTemplate, rc, count, list);
+    va_end(list);
+    return result;
+}
+
+}  // namespace cimhost

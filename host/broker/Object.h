@@ -1,0 +1,66 @@
+#pragma once
+
+#include <optional>
+#include <utility>
+
+#include "broker/Contents.h"
+
+namespace cimhost {
+
+class Arena;
+
+/** Something that an arena owns: the broker's side of an encapsulated object. */
+class Object {
+public:
+    Object(Arena& itsOwner, ObjectKind itsKind) : owner(itsOwner), kindOf(itsKind) {}
+    virtual ~Object() = default;
+    Object(const Object&) = delete;
+    Object& operator=(const Object&) = delete;
+
+    Arena& arena() const { return owner; }
+    ObjectKind kind() const { return kindOf; }
+
+    /** Clones outlive the release of a mark. */
+    bool isClone = false;
+
+private:
+    Arena& owner;
+    ObjectKind kindOf;
+};
+
+/**
+ * An encapsulated object: the handle that the provider sees and what it stands for. After a release the content is
+ * gone; the handle stays, pointing to nothing, until the arena goes, so that a use after release is told, not fatal.
+ */
+template <class Handle>
+class Encapsulated final : public Object {
+public:
+    using Content = typename Traits<Handle>::Content;
+    using Table = std::remove_pointer_t<decltype(Handle::ft)>;
+
+    Encapsulated(Arena& itsOwner, const FunctionTables& tables, Content initial)
+        : Object(itsOwner, Traits<Handle>::kind),
+          // The standard's handles point to tables without const; nobody writes to them.
+          handle{static_cast<Object*>(this), const_cast<Table*>(&(tables.*Traits<Handle>::table))},
+          content(std::move(initial)) {}
+
+    void release() {
+        handle.hdl = nullptr;
+        content.reset();
+    }
+
+    Handle handle;
+    std::optional<Content> content;
+};
+
+/** The object behind a handle; null when the handle is null, released or of another kind. */
+template <class Handle>
+Encapsulated<Handle>* objectOf(const Handle* handle) {
+    if (handle == nullptr || handle->hdl == nullptr) {
+        return nullptr;
+    }
+    auto* object = static_cast<Object*>(handle->hdl);
+    return object->kind() == Traits<Handle>::kind ? static_cast<Encapsulated<Handle>*>(object) : nullptr;
+}
+
+}  // namespace cimhost

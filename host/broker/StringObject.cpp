@@ -1,0 +1,15 @@
+#include "broker/Encapsulation.h"
+#include "broker/Tables.h"
+
+namespace cimhost {
+namespace {
+
+const char* getCharPtr(const CMPIString* string, CMPIStatus* rc) {
+    return guarded<const char*>(rc, nullptr, [&] { return content(string).c_str(); });
+}
+
+}  // namespace
+
+const CMPIStringFT stringTable{tableVersion, releaseObject<CMPIString>, cloneObject<CMPIString>, getCharPtr};
+
+}  // namespace cimhost
