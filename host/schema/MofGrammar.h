@@ -6,8 +6,9 @@
 namespace cimhost::grammar::mof {
 
 struct LineComment : peg::seq<peg::two<'/'>, peg::until<peg::eolf>> {};
-struct CommentBody : peg::until<peg::string<'*', '/'>> {};
-struct BlockComment : peg::if_must<peg::string<'/', '*'>, CommentBody> {};
+struct CommentBody : peg::seq<peg::string<'/', '*'>, peg::until<peg::string<'*', '/'>>> {};
+struct ClosedComment : peg::at<CommentBody> {};  // looks ahead, so that a mistake is found at the start
+struct BlockComment : peg::if_must<peg::at<peg::string<'/', '*'>>, ClosedComment, CommentBody> {};
 struct Skip : peg::star<peg::sor<peg::space, LineComment, BlockComment>> {};
 
 template <typename Rule>

@@ -12,6 +12,8 @@ template <typename Rule>
 inline constexpr const char* expected = nullptr;
 
 template <>
+inline constexpr auto expected<ClosedComment> = "this comment is not closed: expected */";
+template <>
 inline constexpr auto expected<CommentBody> = "this comment is not closed: expected */";
 template <>
 inline constexpr auto expected<StringPart> = "expected text";

@@ -1,0 +1,88 @@
+#include <gmock/gmock.h>
+
+#include <cmath>
+#include <limits>
+
+#include "host/schema/Schemas.h"
+#include "schema/Literal.h"
+
+namespace cimhost::test {
+namespace {
+
+TEST(MofWriter, WritesEachKindOfValueAsAConstant) {
+    EXPECT_EQ(formatMof(singleValue(CMPI_boolean, true)), "TRUE");
+    EXPECT_EQ(formatMof(singleValue(CMPI_uint8, std::uint8_t{200})), "200");
+    EXPECT_EQ(formatMof(singleValue(CMPI_sint64, std::int64_t{INT64_MIN})), "-9223372036854775808");
+    EXPECT_EQ(formatMof(singleValue(CMPI_real64, 0.1)), "0.1");
+    EXPECT_EQ(formatMof(singleValue(CMPI_real64, 3.0)), "3.0");
+    EXPECT_EQ(formatMof(singleValue(CMPI_real64, 1e300)), "1.0e+300");
+    EXPECT_EQ(formatMof(singleValue(CMPI_char16, Char16{u'a'})), "'a'");
+    EXPECT_EQ(formatMof(singleValue(CMPI_char16, Char16{u'\''})), R"('\x0027')");
+    EXPECT_EQ(formatMof(singleValue(CMPI_string, std::string("a\"b\\c\n\x01"))), R"("a\"b\\c\n\x0001")");
+    EXPECT_EQ(formatMof(singleValue(CMPI_string, std::monostate{})), "NULL");
+    EXPECT_EQ(formatMof(Value{CMPI_string, true, false}), "{}");
+}
+
+TEST(MofWriter, WhatMofHasNoWordForIsNull) {
+    EXPECT_EQ(formatMof(singleValue(CMPI_real64, std::numeric_limits<double>::infinity())), "NULL");
+    EXPECT_EQ(formatMof(singleValue(CMPI_real32, std::nanf(""))), "NULL");
+    EXPECT_EQ(formatMof(singleValue(CMPI_ref, std::shared_ptr<const ObjectPath>())), "NULL");
+}
+
+TEST(MofWriter, EmbedsAnInstanceAsAString) {
+    const auto inner = std::make_shared<const Instance>(
+        Instance{{"", "", "Inner", {}}, {{"Text", singleValue(CMPI_string, std::string("x"))}}});
+    EXPECT_EQ(formatMof(singleValue(CMPI_instance, inner)), R"("instance of Inner {\n    Text = \"x\";\n};\n")");
+}
+
+constexpr auto everything = R"(
+    class Other { [Key] string Name; };
+    class Every {
+        [Key] string Key;
+        boolean Flag; char16 Sign; uint8 U8; uint16 U16; uint32 U32; uint64 U64; sint8 S8; sint16 S16; sint32 S32;
+        sint64 S64; real32 R32; real64 R64; string Text; datetime Time; Other REF Link;
+        boolean Flags[]; char16 Signs[]; uint64 Many[]; real64 Reals[]; string Texts[]; datetime Times[]; string None;
+    };)";
+
+constexpr auto filled = R"(instance of Every {
+    Key = "the \"key\" of \\ it";
+    Flag = FALSE;
+    Sign = '\x20AC';
+    U8 = 255;
+    U16 = 65535;
+    U32 = 4294967295;
+    U64 = 18446744073709551615;
+    S8 = -128;
+    S16 = -32768;
+    S32 = -2147483648;
+    S64 = -9223372036854775808;
+    R32 = 1.25;
+    R64 = -1.0e-10;
+    Text = "line one\nline two\t\x007F";
+    Time = "20260131120000.000000+060";
+    Link = "root/cimv2:Other.Name=\"a,b=\\\"c\\\"\"";
+    Flags = {TRUE, FALSE, NULL};
+    Signs = {'a', '\x0000'};
+    Many = {0, 18446744073709551615};
+    Reals = {0.5, 1.0e+100};
+    Texts = {"", "{a, b}", NULL};
+    Times = {"00000001000000.000000:000"};
+    None = NULL;
+};
+)";
+
+TEST(MofWriter, WritesWhatTheReaderReadsForEveryType) {
+    const Schema schema = schemaOf(everything + std::string(filled));
+    ASSERT_EQ(schema.instances().size(), 1U);
+    EXPECT_EQ(formatMof(schema.instances()[0]), filled);
+}
+
+TEST(MofWriter, RealsReadBackAsTheSameNumber) {
+    for (const double real : {0.1, 1.0 / 3, 5e-324, 1.7976931348623157e308, 123456789.125, -0.0}) {
+        const Schema schema = schemaOf("class C { real64 X = " + formatMof(singleValue(CMPI_real64, real)) + "; };");
+        EXPECT_EQ(element<double>(schema.findClass("C")->properties[0].defaultValue), real);
+    }
+}
+
+}  // namespace
+}  // namespace cimhost::test

@@ -1,0 +1,193 @@
+#include <gmock/gmock.h>
+
+#include <map>
+
+#include "host/schema/Schemas.h"
+#include "schema/CimType.h"
+#include "schema/Registration.h"
+
+namespace cimhost::test {
+namespace {
+
+using testing::UnorderedElementsAre;
+
+const std::filesystem::path directory = SCHEMA_DIRECTORY;
+
+/** Each property as "name type", with * for a key and + for one that clients may write. */
+std::vector<std::string> shape(const Class& known) {
+    std::vector<std::string> rows;
+    for (const Property& property : known.properties) {
+        const Qualifier* write = property.findQualifier("Write");
+        const bool writable = write != nullptr && element<bool>(write->value);
+        const std::string type =
+            property.type == CMPI_ref ? property.referenceClass : std::string(typeName(property.type));
+        rows.push_back(property.name + " " + type + (property.isKey() ? "*" : "") + (writable ? "+" : ""));
+    }
+    return rows;
+}
+
+Schema shipped() {
+    Schema schema;
+    MofReader(schema).readFile(directory / "velko.mof");
+    return schema;
+}
+
+using Shapes = std::map<std::string, std::vector<std::string>>;
+
+const Shapes expected = {
+    {"VELKO_Lease",
+     {"Caption string", "Description string", "InstanceID string*", "ElementName string", "ConfigurationName string",
+      "ChangeableType uint16", "Lessor string+", "BaseTermCommencementDate datetime+", "LeaseTerm uint32+",
+      "EarlyTerminationOption boolean+", "FixedPricePurchaseOption boolean+", "RenewalOption boolean+",
+      "BargainRenewalOption boolean+", "BaseRent string+", "FairMarketRental string+", "FairMarketValue string+",
+      "TerminationValue string+", "NetMonthlyLeaseRateFactor uint32+"}},
+    {"VELKO_Warranty",
+     {"Caption string", "Description string", "InstanceID string*", "ElementName string", "ConfigurationName string",
+      "ChangeableType uint16", "WarrantyStartDate datetime+", "WarrantyDuration uint32+", "Warrantor string+"}},
+    {"VELKO_LeaseSetting", {"Antecedent VELKO_ComputerSystem*", "Dependent VELKO_Lease*"}},
+    {"VELKO_WarrantySetting", {"Antecedent VELKO_ComputerSystem*", "Dependent VELKO_Warranty*"}},
+    {"VELKO_OstrelAgent",
+     {"Caption string", "Description string", "BuildNumber string", "Status string", "Name string*",
+      "ProductName string*", "IdentifyingNumber string*", "Vendor string*", "Version string*"}},
+    {"VELKO_AssetIDDetails",
+     {"IdentifyingNumber string*",
+      "Name string*",
+      "Vendor string*",
+      "Version string*",
+      "Caption string",
+      "Description string",
+      "CSName string",
+      "PrimaryOwnerName string+",
+      "PrimaryOwnerPhone string+",
+      "PrimaryOwnerPosition string+",
+      "PrimaryOwnerDepartment string+",
+      "AssetIDStringArea uint32",
+      "AssetNumber string+",
+      "AssetIdTag string",
+      "ProductName string",
+      "PersonalizedLabel1 string+",
+      "PersonalizedData1 string+",
+      "PersonalizedLabel2 string+",
+      "PersonalizedData2 string+",
+      "PersonalizedLabel3 string+",
+      "PersonalizedData3 string+",
+      "PersonalizedLabel4 string+",
+      "PersonalizedData4 string+",
+      "PersonalizedLabel5 string+",
+      "PersonalizedData5 string+",
+      "LastInventoried datetime+",
+      "PurchaseDate datetime+",
+      "SystemLocation string+",
+      "LocalDateTime datetime",
+      "ZOPMProfile string+",
+      "ZOPMUpdateTime datetime+",
+      "DeploymentProfile string",
+      "DeploymentUpdateTime datetime"}},
+    {"VELKO_ComputerSystem",
+     {"Name string*", "Caption string", "Description string", "ElementName string", "Vendor string", "Model string",
+      "ProductName string"}},
+};
+
+TEST(ShippedSchema, HasTheClassesWithTheirPropertiesInOrder) {
+    const Schema schema = shipped();
+    Shapes found;
+    for (const Class* each : schema.classes()) {
+        found[each->name] = shape(*each);
+    }
+    EXPECT_EQ(found, expected);
+}
+
+TEST(ShippedSchema, EveryClassFileStandsAloneInsideItsQualifiers) {
+    for (const auto& [name, properties] : expected) {
+        Schema schema;
+        MofReader reader(schema);
+        reader.readFile(directory / "qualifiers.mof");
+        reader.readFile(directory / (name + ".mof"));
+        ASSERT_EQ(schema.classes().size(), 1U) << name;
+        EXPECT_EQ(schema.classes()[0]->name, name);
+        EXPECT_EQ(schema.classes()[0]->superclass, "") << name;
+    }
+}
+
+TEST(ShippedSchema, DeclaresEveryQualifierThatItUses) {
+    const Schema schema = shipped();
+    for (const Class* each : schema.classes()) {
+        for (const Property& property : each->properties) {
+            for (const Qualifier& qualifier : property.qualifiers) {
+                EXPECT_FALSE(schema.findQualifier(qualifier.name)->standard)
+                    << qualifier.name << " of " << property.name;
+            }
+        }
+    }
+}
+
+TEST(ShippedSchema, DescribesEveryClassAndPropertyInAFullSentence) {
+    const auto describe = [](const Qualifier* qualifier) {
+        return qualifier == nullptr ? std::string() : element<std::string>(qualifier->value);
+    };
+    const Schema schema = shipped();
+    for (const Class* each : schema.classes()) {
+        EXPECT_THAT(describe(each->findQualifier("Description")), testing::MatchesRegex("[A-Z].*[.]")) << each->name;
+        for (const Property& property : each->properties) {
+            EXPECT_THAT(describe(property.findQualifier("Description")), testing::MatchesRegex("[A-Z].*[.]"))
+                << each->name << "." << property.name;
+        }
+    }
+}
+
+TEST(ShippedSchema, SettingsAreAssociationsAndTheirReferencesBearNoRead) {
+    const Schema schema = shipped();
+    for (const Class* each : schema.classes()) {
+        const bool setting = each->name == "VELKO_LeaseSetting" || each->name == "VELKO_WarrantySetting";
+        EXPECT_EQ(each->isAssociation(), setting) << each->name;
+        for (const Property& property : each->properties) {
+            EXPECT_EQ(property.findQualifier("Read") == nullptr, setting) << each->name << "." << property.name;
+        }
+    }
+}
+
+TEST(ShippedSchema, TheFilesLoadInTheOrderOfTheirNamesToo) {
+    std::vector<std::filesystem::path> files;
+    for (const auto& entry : std::filesystem::directory_iterator(directory)) {
+        if (entry.path().extension() == ".mof") {
+            files.push_back(entry.path());
+        }
+    }
+    std::sort(files.begin(), files.end());
+    Schema schema;
+    MofReader reader(schema);
+    for (const auto& file : files) {
+        reader.readFile(file);
+    }
+    EXPECT_EQ(schema.classes().size(), expected.size());
+}
+
+TEST(ShippedRegistration, NamesOneProviderForEachServedClass) {
+    std::vector<std::string> classes;
+    const Schema schema = shipped();
+    for (const ProviderRegistration& stanza : readRegistrationFile(directory / "LeaseAndWarrantyProvider.reg")) {
+        classes.push_back(stanza.className);
+        EXPECT_EQ(stanza.provider, "LeaseAndWarrantyProvider");
+        EXPECT_EQ(stanza.location, "LeaseAndWarrantyProvider");
+        EXPECT_TRUE(stanza.instance);
+        EXPECT_EQ(stanza.association, schema.findClass(stanza.className)->isAssociation()) << stanza.className;
+        EXPECT_THAT(stanza.nameSpaces, testing::ElementsAre("root/cimv2"));
+        EXPECT_EQ(stanza.group, "LeaseAndWarranty");
+        EXPECT_EQ(stanza.unload, "never");
+    }
+    EXPECT_THAT(classes, UnorderedElementsAre("VELKO_Lease", "VELKO_Warranty", "VELKO_LeaseSetting",
+                                              "VELKO_WarrantySetting", "VELKO_OstrelAgent", "VELKO_AssetIDDetails"));
+}
+
+TEST(ShippedRegistration, NamesAProviderOfItsOwnForComputers) {
+    const auto stanzas = readRegistrationFile(directory / "ComputerSystemProvider.reg");
+    ASSERT_EQ(stanzas.size(), 1U);
+    EXPECT_EQ(stanzas[0].className, "VELKO_ComputerSystem");
+    EXPECT_EQ(stanzas[0].provider, "ComputerSystemProvider");
+    EXPECT_EQ(stanzas[0].location, "ComputerSystemProvider");
+    EXPECT_TRUE(stanzas[0].instance);
+    EXPECT_FALSE(stanzas[0].association);
+}
+
+}  // namespace
+}  // namespace cimhost::test
