@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "broker/Boundary.h"
+#include "schema/Names.h"
 
 namespace cimhost {
 namespace {
@@ -59,6 +60,15 @@ Broker& Broker::of(const CMPIBroker* handle) {
 
 std::shared_ptr<const ClassShape> Broker::classShape(const std::string& className) const {
     return options.classShape ? options.classShape(className) : nullptr;
+}
+
+bool Broker::isA(const std::string& className, const std::string& ancestor) const {
+    if (sameName(className, ancestor)) {
+        return true;
+    }
+    const auto shape = classShape(className);
+    return shape && std::any_of(shape->superclasses.begin(), shape->superclasses.end(),
+                                [&](const std::string& each) { return sameName(each, ancestor); });
 }
 
 void Broker::log(const LogRecord& record) const {

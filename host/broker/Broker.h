@@ -59,6 +59,9 @@ public:
     /** Shape of a class, or null when it is not known. */
     std::shared_ptr<const ClassShape> classShape(const std::string& className) const;
 
+    /** Whether the class is the other one or is known to descend from it. */
+    bool isA(const std::string& className, const std::string& ancestor) const;
+
     void log(const LogRecord& record) const;
 
     /** Where objects made now on this thread go. */

@@ -1,4 +1,3 @@
-#include <algorithm>
 #include <cstring>
 
 #include "broker/Boundary.h"
@@ -9,7 +8,6 @@
 #include "broker/NamedValues.h"
 #include "broker/Tables.h"
 #include "broker/ToText.h"
-#include "schema/Names.h"
 #include "schema/Text.h"
 
 // CMPIBrokerEncFT: making encapsulated objects, and services around them.
@@ -114,17 +112,9 @@ CMPISelectExp* newSelectExp(const CMPIBroker* broker, const char*, const char*, 
 }
 
 CMPIBoolean classPathIsA(const CMPIBroker* broker, const CMPIObjectPath* path, const char* className, CMPIStatus* rc) {
-    return guarded<CMPIBoolean>(rc, 0, [&]() -> CMPIBoolean {
-        const Broker& owner = Broker::of(broker);
-        const std::string& own = argument(path).className;
-        const std::string ancestor = argument(className);
-        if (sameName(own, ancestor)) {
-            return 1;
-        }
-        const auto shape = owner.classShape(own);
-        const bool descends = shape && std::any_of(shape->superclasses.begin(), shape->superclasses.end(),
-                                                   [&](const std::string& each) { return sameName(each, ancestor); });
-        return descends ? 1 : 0;
+    return guarded<CMPIBoolean>(rc, 0, [&] {
+        const bool isA = Broker::of(broker).isA(argument(path).className, argument(className));
+        return static_cast<CMPIBoolean>(isA ? 1 : 0);
     });
 }
 

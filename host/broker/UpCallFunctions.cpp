@@ -29,8 +29,8 @@ const ContextEntries& entriesOf(const CMPIContext* context) {
     return context == nullptr ? none : argument(context).entries;
 }
 
-std::string textOrNone(const char* text) {
-    return text == nullptr ? std::string{} : std::string(text);
+std::optional<std::string> textIfAny(const char* text) {
+    return text == nullptr ? std::nullopt : std::optional<std::string>(text);
 }
 
 template <class Kind>
@@ -141,8 +141,8 @@ CMPIEnumeration* associators(const CMPIBroker* handle, const CMPIContext* contex
                              const char* resultRole, const char** properties, CMPIStatus* rc) {
     return guarded<CMPIEnumeration*>(rc, nullptr, [&] {
         Broker& broker = Broker::of(handle);
-        const AssociationFilter filter{textOrNone(associationClass), textOrNone(resultClass), textOrNone(role),
-                                       textOrNone(resultRole)};
+        const AssociationFilter filter{textIfAny(associationClass), textIfAny(resultClass), textIfAny(role),
+                                       textIfAny(resultRole)};
         return enumerationOf(broker, broker.upCalls().associators(entriesOf(context), argument(path), filter,
                                                                   propertyListFrom(properties)));
     });
@@ -153,8 +153,8 @@ CMPIEnumeration* associatorNames(const CMPIBroker* handle, const CMPIContext* co
                                  const char* resultRole, CMPIStatus* rc) {
     return guarded<CMPIEnumeration*>(rc, nullptr, [&] {
         Broker& broker = Broker::of(handle);
-        const AssociationFilter filter{textOrNone(associationClass), textOrNone(resultClass), textOrNone(role),
-                                       textOrNone(resultRole)};
+        const AssociationFilter filter{textIfAny(associationClass), textIfAny(resultClass), textIfAny(role),
+                                       textIfAny(resultRole)};
         return enumerationOf(broker, broker.upCalls().associatorNames(entriesOf(context), argument(path), filter));
     });
 }
@@ -163,7 +163,7 @@ CMPIEnumeration* references(const CMPIBroker* handle, const CMPIContext* context
                             const char* resultClass, const char* role, const char** properties, CMPIStatus* rc) {
     return guarded<CMPIEnumeration*>(rc, nullptr, [&] {
         Broker& broker = Broker::of(handle);
-        const AssociationFilter filter{{}, textOrNone(resultClass), textOrNone(role), {}};
+        const AssociationFilter filter{{}, textIfAny(resultClass), textIfAny(role), {}};
         return enumerationOf(broker, broker.upCalls().references(entriesOf(context), argument(path), filter,
                                                                  propertyListFrom(properties)));
     });
@@ -173,7 +173,7 @@ CMPIEnumeration* referenceNames(const CMPIBroker* handle, const CMPIContext* con
                                 const char* resultClass, const char* role, CMPIStatus* rc) {
     return guarded<CMPIEnumeration*>(rc, nullptr, [&] {
         Broker& broker = Broker::of(handle);
-        const AssociationFilter filter{{}, textOrNone(resultClass), textOrNone(role), {}};
+        const AssociationFilter filter{{}, textIfAny(resultClass), textIfAny(role), {}};
         return enumerationOf(broker, broker.upCalls().referenceNames(entriesOf(context), argument(path), filter));
     });
 }

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -12,12 +13,12 @@ namespace cimhost {
 /** The entries of a request's context, such as CMPIInvocationFlags and CMPIPrincipal. */
 using ContextEntries = std::vector<NamedValue>;
 
-/** Names that narrow down an association operation; empty text means that the caller gave none. */
+/** Names that narrow down an association operation; none where the caller gave none. */
 struct AssociationFilter {
-    std::string associationClass{};  ///< not for references, where the association class is the result class
-    std::string resultClass{};
-    std::string role{};
-    std::string resultRole{};  ///< not for references
+    std::optional<std::string> associationClass{};  ///< not for references, where the result class is the association's
+    std::optional<std::string> resultClass{};
+    std::optional<std::string> role{};
+    std::optional<std::string> resultRole{};  ///< not for references
 };
 
 /**

@@ -1,0 +1,77 @@
+#include "operations/Interfaces.h"
+
+#include "broker/RequestScope.h"
+#include "operations/LibraryError.h"
+#include "operations/ProviderCall.h"
+
+namespace cimhost {
+namespace {
+
+template <class Interface>
+using NamedFactory = Interface*(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
+
+template <class Interface>
+using GenericFactory = Interface*(const CMPIBroker*, const CMPIContext*, const char*, CMPIStatus*);
+
+/** Calls whichever factory the library has. */
+template <class Interface>
+Interface* callFactory(const LoadedLibrary& library, const std::string& provider, const CMPIBroker* broker,
+                       const CMPIContext* context, CMPIStatus* rc) {
+    const std::string suffix = std::string("_Create_") + nameOf(InterfaceTraits<Interface>::kind) + "MI";
+    if (auto* named = library.function<NamedFactory<Interface>>(provider + suffix)) {
+        return named(broker, context, rc);
+    }
+    if (auto* generic = library.function<GenericFactory<Interface>>("_Generic" + suffix)) {
+        return generic(broker, context, provider.c_str(), rc);
+    }
+    throw LibraryError(library.file().string() + " has neither " + provider + suffix + " nor _Generic" + suffix);
+}
+
+[[noreturn]] void factoryFailed(const LoadedLibrary& library, const std::string& provider, const Status& status) {
+    throw LibraryError("The factory of provider " + provider + " in " + library.file().string() + " failed with code " +
+                       std::to_string(status.rc) + (status.message.empty() ? std::string{} : ": " + status.message));
+}
+
+}  // namespace
+
+const char* nameOf(InterfaceKind kind) {
+    return kind == InterfaceKind::instance ? "Instance" : "Association";
+}
+
+template <class Interface>
+Interface* createInterface(const LoadedLibrary& library, const std::string& provider, Broker& broker,
+                           const CMPIBroker* handle) {
+    RequestScope scope(broker);
+    const CMPIContext* context = scope.context({});
+    Interface* interface = nullptr;
+    const ProviderCall call = callProvider([&] {
+        CMPIStatus status{CMPI_RC_OK, nullptr};
+        interface = callFactory<Interface>(library, provider, handle, context, &status);
+        return status;
+    });
+    if (!call.status.ok()) {
+        factoryFailed(library, provider, call.status);
+    }
+    if (interface == nullptr || interface->ft == nullptr) {
+        factoryFailed(library, provider, {CMPI_RC_OK, "it answered no interface"});
+    }
+    return interface;
+}
+
+template <class Interface>
+CMPIrc cleanUp(Interface* interface, Broker& broker, bool terminating) {
+    if (interface->ft->cleanup == nullptr) {
+        return CMPI_RC_OK;
+    }
+    RequestScope scope(broker);
+    const CMPIContext* context = scope.context({});
+    const CMPIBoolean flag = terminating ? 1 : 0;
+    return callProvider([&] { return interface->ft->cleanup(interface, context, flag); }).status.rc;
+}
+
+template CMPIInstanceMI* createInterface(const LoadedLibrary&, const std::string&, Broker&, const CMPIBroker*);
+template CMPIAssociationMI* createInterface(const LoadedLibrary&, const std::string&, Broker&, const CMPIBroker*);
+template CMPIrc cleanUp(CMPIInstanceMI*, Broker&, bool);
+template CMPIrc cleanUp(CMPIAssociationMI*, Broker&, bool);
+
+}  // namespace cimhost

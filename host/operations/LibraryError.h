@@ -1,0 +1,13 @@
+#pragma once
+
+#include <stdexcept>
+
+namespace cimhost {
+
+/** A provider that cannot be had: its library is missing or cannot be loaded, or its factory is missing or fails. */
+class LibraryError : public std::runtime_error {
+public:
+    using std::runtime_error::runtime_error;
+};
+
+}  // namespace cimhost

@@ -1,0 +1,55 @@
+#pragma once
+
+#include <map>
+#include <memory>
+#include <mutex>
+#include <string>
+#include <utility>
+
+#include "operations/Interfaces.h"
+#include "operations/LoadedLibrary.h"
+#include "operations/ProviderRegistry.h"
+
+namespace cimhost {
+
+/**
+ * The providers in this process. Libraries are loaded and factories called when a provider is first needed, once an
+ * interface; after a failure the next need tries again. In the end every interface is cleaned up and every library
+ * closed, unless its provider's cleanup asks to stay. Safe to use from several threads and from inside requests.
+ */
+class ProviderPool {
+public:
+    ProviderPool(Broker& itsBroker, LibraryOptions itsOptions);
+    ~ProviderPool();
+    ProviderPool(const ProviderPool&) = delete;
+    ProviderPool& operator=(const ProviderPool&) = delete;
+
+    /** The provider's interface; good as long as the pool. @throws LibraryError when it cannot be had */
+    template <class Interface>
+    Interface* get(const ProviderAddress& address);
+
+private:
+    /** A provider in its library, with the interfaces made so far. */
+    struct Provider {
+        LoadedLibrary* library = nullptr;
+        CMPIInstanceMI* instance = nullptr;
+        CMPIAssociationMI* association = nullptr;
+        bool isStarting = false;  ///< a factory is running
+    };
+
+    template <class Interface>
+    static Interface*& member(Provider& provider);
+
+    template <class Interface>
+    void end(Provider& provider, Interface* interface);
+
+    LoadedLibrary& library(const std::string& location);
+
+    Broker& broker;
+    LibraryOptions options;
+    std::recursive_mutex mutex;  ///< recursive: a factory may make a request that needs another provider
+    std::map<std::string, std::unique_ptr<LoadedLibrary>> libraries;    ///< by location
+    std::map<std::pair<std::string, std::string>, Provider> providers;  ///< by location and name
+};
+
+}  // namespace cimhost
