@@ -1,68 +1,38 @@
-/* CMPI 2.0 data types */
+/*
+ * CMPI 2.0 data types: what values look like when they pass between an object manager (the broker)
+ * and a provider. The functions that work on them are in cmpift.h, shorthand for them in cmpimacs.h.
+ *
+ * The header is C99 and C++. Sizes, values, member order and struct tags are those of the CMPI 2.0
+ * standard on 64-bit Linux; a provider compiled against it runs under any broker of that standard.
+ */
 #ifndef CMPIDT_H
 #define CMPIDT_H
 
+#include "cmpi20/names.h"
+
 #include <stddef.h>
-#include <time.h>
 
 #ifdef __cplusplus
 extern "C" {
 #endif
 
+/** @name Versions
+ * What the version members of function tables hold: the interface version times a hundred.
+ */
+///@{
 #define CMPIVersion100 100
 #define CMPIVersion200 200
+#define CMPICurrentVersion CMPIVersion200
+///@}
 
-typedef struct _CMPIValuePtr CMPIValuePtr;
-typedef union _CMPIValue CMPIValue;
-typedef struct _CMPIData CMPIData;
-typedef struct _CMPIStatus CMPIStatus;
-typedef struct _CMPIBroker CMPIBroker;
-typedef struct _CMPIBrokerFT CMPIBrokerFT;
-typedef struct _CMPIBrokerEncFT CMPIBrokerEncFT;
-typedef struct _CMPIBrokerExtFT CMPIBrokerExtFT;
-typedef struct _CMPIBrokerMemFT CMPIBrokerMemFT;
-typedef struct _CMPIContext CMPIContext;
-typedef struct _CMPIContextFT CMPIContextFT;
-typedef struct _CMPIResult CMPIResult;
-typedef struct _CMPIResultFT CMPIResultFT;
-typedef struct _CMPIError CMPIError;
-typedef struct _CMPIErrorFT CMPIErrorFT;
-typedef struct _CMPIInstance CMPIInstance;
-typedef struct _CMPIInstanceFT CMPIInstanceFT;
-typedef struct _CMPIObjectPath CMPIObjectPath;
-typedef struct _CMPIObjectPathFT CMPIObjectPathFT;
-typedef struct _CMPIArgs CMPIArgs;
-typedef struct _CMPIArgsFT CMPIArgsFT;
-typedef struct _CMPIString CMPIString;
-typedef struct _CMPIStringFT CMPIStringFT;
-typedef struct _CMPIArray CMPIArray;
-typedef struct _CMPIArrayFT CMPIArrayFT;
-typedef struct _CMPIEnumeration CMPIEnumeration;
-typedef struct _CMPIEnumerationFT CMPIEnumerationFT;
-typedef struct _CMPIDateTime CMPIDateTime;
-typedef struct _CMPIDateTimeFT CMPIDateTimeFT;
-typedef struct _CMPISelectExp CMPISelectExp;
-typedef struct _CMPISelectExpFT CMPISelectExpFT;
-typedef struct _CMPISelectCond CMPISelectCond;
-typedef struct _CMPISelectCondFT CMPISelectCondFT;
-typedef struct _CMPISubCond CMPISubCond;
-typedef struct _CMPISubCondFT CMPISubCondFT;
-typedef struct _CMPIPredicate CMPIPredicate;
-typedef struct _CMPIPredicateFT CMPIPredicateFT;
-typedef struct _CMPIInstanceMI CMPIInstanceMI;
-typedef struct _CMPIInstanceMIFT CMPIInstanceMIFT;
-typedef struct _CMPIAssociationMI CMPIAssociationMI;
-typedef struct _CMPIAssociationMIFT CMPIAssociationMIFT;
-typedef struct _CMPIMethodMI CMPIMethodMI;
-typedef struct _CMPIMethodMIFT CMPIMethodMIFT;
-typedef struct _CMPIPropertyMI CMPIPropertyMI;
-typedef struct _CMPIPropertyMIFT CMPIPropertyMIFT;
-typedef struct _CMPIIndicationMI CMPIIndicationMI;
-typedef struct _CMPIIndicationMIFT CMPIIndicationMIFT;
+/* ---------------------------------------------------------------------------------------------- */
+/* Scalars                                                                                         */
+/* ---------------------------------------------------------------------------------------------- */
 
-typedef unsigned int CMPICount;
-typedef unsigned char CMPIBoolean;
-typedef unsigned short CMPIChar16;
+/** @name CIM scalars */
+///@{
+typedef unsigned char CMPIBoolean; /**< 0 is false, anything else is true */
+typedef unsigned short CMPIChar16; /**< one UCS-2 character */
 typedef unsigned char CMPIUint8;
 typedef unsigned short CMPIUint16;
 typedef unsigned int CMPIUint32;
@@ -73,81 +43,178 @@ typedef int CMPISint32;
 typedef long long CMPISint64;
 typedef float CMPIReal32;
 typedef double CMPIReal64;
-typedef unsigned short CMPIType;
-typedef unsigned short CMPIValueState;
-typedef void * CMPIMsgFileHandle;
-typedef void CMPIGcStat;
-typedef unsigned int CMPIFlags;
+///@}
 
-#define CMPI_null 0
-#define CMPI_SIMPLE 2
-#define CMPI_boolean 2
-#define CMPI_char16 3
-#define CMPI_REAL 8
-#define CMPI_real32 8
-#define CMPI_real64 12
-#define CMPI_UINT 128
-#define CMPI_uint8 128
-#define CMPI_uint16 144
-#define CMPI_uint32 160
-#define CMPI_uint64 176
-#define CMPI_SINT 192
-#define CMPI_sint8 192
-#define CMPI_sint16 208
-#define CMPI_sint32 224
-#define CMPI_sint64 240
-#define CMPI_INTEGER 192
-#define CMPI_ENC 4096
-#define CMPI_instance 4096
-#define CMPI_ref 4352
-#define CMPI_args 4608
-#define CMPI_class 4864
-#define CMPI_filter 5120
-#define CMPI_enumeration 5376
-#define CMPI_string 5632
-#define CMPI_chars 5888
-#define CMPI_dateTime 6144
-#define CMPI_ptr 6400
-#define CMPI_charsptr 6656
-#define CMPI_ARRAY 8192
-#define CMPI_booleanA 8194
-#define CMPI_uint8A 8320
-#define CMPI_uint16A 8336
-#define CMPI_uint32A 8352
-#define CMPI_uint64A 8368
-#define CMPI_sint32A 8416
-#define CMPI_stringA 13824
-#define CMPI_charsA 14080
-#define CMPI_dateTimeA 14336
-#define CMPI_instanceA 12288
-#define CMPI_refA 12544
-#define CMPI_keyInteger 240
-#define CMPI_keyString 5632
-#define CMPI_keyBoolean 2
-#define CMPI_keyRef 4352
-#define CMPI_goodValue ((CMPIValueState)0)
-#define CMPI_nullValue ((CMPIValueState)256)
-#define CMPI_keyValue ((CMPIValueState)512)
-#define CMPI_notFound ((CMPIValueState)1024)
-#define CMPI_badValue ((CMPIValueState)32768)
-#define CMPI_FLAG_LocalOnly 1
-#define CMPI_FLAG_DeepInheritance 2
-#define CMPI_FLAG_IncludeQualifiers 4
-#define CMPI_FLAG_IncludeClassOrigin 8
-#define CMPI_MB_BasicRead 1
-#define CMPI_MB_BasicWrite 3
-#define CMPI_MB_InstanceManipulation 7
-#define CMPI_MB_AssociationTraversal 9
-#define CMPI_MB_Class_0 1
-#define CMPI_MB_Class_1 3
-#define CMPI_MB_Class_2 7
-#define CMPIPrincipal "CMPIPrincipal"
-#define CMPIInvocationFlags "CMPIInvocationFlags"
-#define CMPIInitNameSpace "CMPIInitNameSpace"
-#define CMPIRole "CMPIRole"
-#define CMPIAcceptLanguage "CMPIAcceptLanguage"
-#define CMPIContentLanguage "CMPIContentLanguage"
+/** @name Scalars of the interface itself */
+///@{
+typedef unsigned int CMPICount;        /**< a number of elements, or a zero-based position */
+typedef unsigned int CMPIFlags;        /**< a set of CMPI_FLAG_ bits */
+typedef unsigned short CMPIType;       /**< one of the types below */
+typedef unsigned short CMPIValueState; /**< a set of the value states below */
+typedef void* CMPIMsgFileHandle;       /**< an open message catalogue of the broker */
+typedef void CMPIGcStat;               /**< a mark of the broker's memory, only ever pointed to */
+///@}
 
+/* ---------------------------------------------------------------------------------------------- */
+/* Types                                                                                           */
+/* ---------------------------------------------------------------------------------------------- */
+
+/** @name Types of values
+ * The type says which member of CMPIValue holds the value; its bits say what family it is of.
+ */
+///@{
+#define CMPI_null 0x0000 /**< no type: there is no value */
+
+#define CMPI_SIMPLE 0x0002 /**< family of boolean and char16 */
+#define CMPI_boolean 0x0002
+#define CMPI_char16 0x0003
+
+#define CMPI_REAL 0x0008 /**< family of the floating-point types */
+#define CMPI_real32 0x0008
+#define CMPI_real64 0x000c
+
+#define CMPI_UINT 0x0080 /**< family of the unsigned integers */
+#define CMPI_uint8 0x0080
+#define CMPI_uint16 0x0090
+#define CMPI_uint32 0x00a0
+#define CMPI_uint64 0x00b0
+
+#define CMPI_SINT 0x00c0 /**< family of the signed integers; contains the bit of the unsigned ones */
+#define CMPI_sint8 0x00c0
+#define CMPI_sint16 0x00d0
+#define CMPI_sint32 0x00e0
+#define CMPI_sint64 0x00f0
+
+#define CMPI_INTEGER 0x00c0 /**< every integer shares a bit with this mask */
+
+#define CMPI_ENC 0x1000 /**< family of the types whose value is a pointer */
+#define CMPI_instance 0x1000
+#define CMPI_ref 0x1100 /**< an object path */
+#define CMPI_args 0x1200
+#define CMPI_class 0x1300
+#define CMPI_filter 0x1400 /**< a select expression */
+#define CMPI_enumeration 0x1500
+#define CMPI_string 0x1600 /**< a string object of the broker */
+#define CMPI_chars 0x1700  /**< characters ended by a zero; their own address is passed where a value's is asked for */
+#define CMPI_dateTime 0x1800
+#define CMPI_ptr 0x1900      /**< bytes with a length, meaningful to provider and caller only */
+#define CMPI_charsptr 0x1a00 /**< a pointer to a character pointer */
+///@}
+
+/** @name Types of arrays
+ * An array's type is the type of its elements with one more bit.
+ */
+///@{
+#define CMPI_ARRAY 0x2000
+#define CMPI_booleanA (CMPI_ARRAY | CMPI_boolean)
+#define CMPI_char16A (CMPI_ARRAY | CMPI_char16)
+#define CMPI_real32A (CMPI_ARRAY | CMPI_real32)
+#define CMPI_real64A (CMPI_ARRAY | CMPI_real64)
+#define CMPI_uint8A (CMPI_ARRAY | CMPI_uint8)
+#define CMPI_uint16A (CMPI_ARRAY | CMPI_uint16)
+#define CMPI_uint32A (CMPI_ARRAY | CMPI_uint32)
+#define CMPI_uint64A (CMPI_ARRAY | CMPI_uint64)
+#define CMPI_sint8A (CMPI_ARRAY | CMPI_sint8)
+#define CMPI_sint16A (CMPI_ARRAY | CMPI_sint16)
+#define CMPI_sint32A (CMPI_ARRAY | CMPI_sint32)
+#define CMPI_sint64A (CMPI_ARRAY | CMPI_sint64)
+#define CMPI_stringA (CMPI_ARRAY | CMPI_string)
+#define CMPI_charsA (CMPI_ARRAY | CMPI_chars)
+#define CMPI_dateTimeA (CMPI_ARRAY | CMPI_dateTime)
+#define CMPI_instanceA (CMPI_ARRAY | CMPI_instance)
+#define CMPI_refA (CMPI_ARRAY | CMPI_ref)
+///@}
+
+/** @name Types of keys
+ * Other names for the types a key of an object path usually has.
+ */
+///@{
+#define CMPI_keyInteger CMPI_sint64
+#define CMPI_keyString CMPI_string
+#define CMPI_keyBoolean CMPI_boolean
+#define CMPI_keyRef CMPI_ref
+///@}
+
+/* ---------------------------------------------------------------------------------------------- */
+/* Values                                                                                          */
+/* ---------------------------------------------------------------------------------------------- */
+
+/** @name States of values
+ * Bits beside a value. Without a bit set it is good; with the null bit the value must not be read.
+ */
+///@{
+#define CMPI_goodValue ((CMPIValueState)0x0000)
+#define CMPI_nullValue ((CMPIValueState)0x0100) /**< typed, but without a value */
+#define CMPI_keyValue ((CMPIValueState)0x0200)  /**< the value is one of a key */
+#define CMPI_notFound ((CMPIValueState)0x0400)  /**< what was asked for does not exist */
+#define CMPI_badValue ((CMPIValueState)0x8000)  /**< the value is unusable */
+///@}
+
+/** Bytes of any meaning: where they start and how many there are. */
+struct _CMPIValuePtr {
+    void* ptr;        /**< null: none */
+    CMPICount length; /**< in bytes */
+};
+
+/**
+ * A value of any type. The type that stands beside it (in CMPIData, or as the next argument) names
+ * the member to read. Pointers are borrowed: storing one here gives nothing away.
+ */
+union _CMPIValue {
+    CMPIUint64 uint64;
+    CMPIUint32 uint32;
+    CMPIUint16 uint16;
+    CMPIUint8 uint8;
+    CMPISint64 sint64;
+    CMPISint32 sint32;
+    CMPISint16 sint16;
+    CMPISint8 sint8;
+    CMPIReal64 real64;
+    CMPIReal32 real32;
+    CMPIBoolean boolean;
+    CMPIChar16 char16;
+
+    CMPIInstance* inst;
+    CMPIObjectPath* ref;
+    CMPIArgs* args;
+    CMPISelectExp* filter;
+    CMPIEnumeration* Enum;
+    CMPIArray* array;
+    CMPIString* string;
+    char* chars;
+    CMPIDateTime* dateTime;
+    CMPIValuePtr dataPtr;
+
+    /** @name The same integers and reals under the names of C types */
+    ///@{
+    CMPISint8 Byte;
+    CMPISint16 Short;
+    CMPISint32 Int;
+    CMPISint64 Long;
+    CMPIReal32 Float;
+    CMPIReal64 Double;
+    ///@}
+};
+
+/** A value with its type and state: what every reading function answers. Look at the state first. */
+struct _CMPIData {
+    CMPIType type;
+    CMPIValueState state;
+    CMPIValue value;
+};
+
+/**
+ * Reads a property by name, for the evaluation of a select expression without an instance.
+ * @param name the property asked for
+ * @param parameter what was handed to the evaluating function along with the accessor
+ */
+typedef CMPIData CMPIAccessor(const char* name, void* parameter);
+
+/* ---------------------------------------------------------------------------------------------- */
+/* Status                                                                                          */
+/* ---------------------------------------------------------------------------------------------- */
+
+/** How an operation ended. 1 to 17 are the status codes that CIM clients see. */
 typedef enum _CMPIrc {
     CMPI_RC_OK = 0,
     CMPI_RC_ERR_FAILED = 1,
@@ -167,14 +234,69 @@ typedef enum _CMPIrc {
     CMPI_RC_ERR_INVALID_QUERY = 15,
     CMPI_RC_ERR_METHOD_NOT_AVAILABLE = 16,
     CMPI_RC_ERR_METHOD_NOT_FOUND = 17,
-    CMPI_RC_DO_NOT_UNLOAD = 50,
-    CMPI_RC_NEVER_UNLOAD = 51,
-    CMPI_RC_ERR_INVALID_HANDLE = 60,
-    CMPI_RC_ERR_INVALID_DATA_TYPE = 61,
-    CMPI_RC_ERROR_SYSTEM = 100,
-    CMPI_RC_ERROR = 200
+    CMPI_RC_DO_NOT_UNLOAD = 50,         /**< answer of a cleanup: not now, ask again */
+    CMPI_RC_NEVER_UNLOAD = 51,          /**< answer of a cleanup: keep the provider for good */
+    CMPI_RC_ERR_INVALID_HANDLE = 60,    /**< an object is not what the function expects, or is gone */
+    CMPI_RC_ERR_INVALID_DATA_TYPE = 61, /**< a type is not known, or is not allowed here */
+    CMPI_RC_ERROR_SYSTEM = 100,         /**< the operating system refused something */
+    CMPI_RC_ERROR = 200                 /**< the broker itself failed */
 } CMPIrc;
 
+/**
+ * A code and, where there is more to say, a message; a null message says nothing more. Functions
+ * that take a pointer to one fill both members, and take null from a caller who does not care.
+ */
+struct _CMPIStatus {
+    CMPIrc rc;
+    CMPIString* msg;
+};
+
+/* ---------------------------------------------------------------------------------------------- */
+/* What a broker can, and what a request asks                                                      */
+/* ---------------------------------------------------------------------------------------------- */
+
+/** @name What a broker supports
+ * Bits of the broker's capabilities; each contains those it builds on.
+ */
+///@{
+#define CMPI_MB_BasicRead 0x0001
+#define CMPI_MB_BasicWrite 0x0003
+#define CMPI_MB_InstanceManipulation 0x0007
+#define CMPI_MB_AssociationTraversal 0x0009
+///@}
+
+/** @name Classes of brokers */
+///@{
+#define CMPI_MB_Class_0 0x0001
+#define CMPI_MB_Class_1 0x0003
+#define CMPI_MB_Class_2 0x0007
+///@}
+
+/** @name Invocation flags
+ * What the client asked for, under the context entry CMPIInvocationFlags.
+ */
+///@{
+#define CMPI_FLAG_LocalOnly 0x0001
+#define CMPI_FLAG_DeepInheritance 0x0002
+#define CMPI_FLAG_IncludeQualifiers 0x0004
+#define CMPI_FLAG_IncludeClassOrigin 0x0008
+///@}
+
+/** @name Names of context entries */
+///@{
+#define CMPIInitNameSpace "CMPIInitNameSpace"     /**< string: the namespace of the provider's registration */
+#define CMPIInvocationFlags "CMPIInvocationFlags" /**< uint32: CMPI_FLAG_ bits */
+#define CMPIPrincipal "CMPIPrincipal"             /**< string: who is asking */
+#define CMPIRole "CMPIRole"                       /**< string: in what role */
+#define CMPIAcceptLanguage "CMPIAcceptLanguage"   /**< string: the languages the client prefers */
+#define CMPIContentLanguage "CMPIContentLanguage" /**< string: the language of what the client sent */
+///@}
+
+/* ---------------------------------------------------------------------------------------------- */
+/* Enumerations of single functions                                                                */
+/* ---------------------------------------------------------------------------------------------- */
+
+/** What a predicate compares, or how it joins others. */
 typedef enum _CMPIPredOp {
     CMPI_PredOp_Equals = 1,
     CMPI_PredOp_NotEquals = 2,
@@ -192,27 +314,27 @@ typedef enum _CMPIPredOp {
     CMPI_PredOp_Or = 14
 } CMPIPredOp;
 
+/** How the sub-conditions of a condition are joined. */
+typedef enum _CMPISelectCondType {
+    CMPI_COND_DOC = 0, /**< a disjunction of conjunctions */
+    CMPI_COND_COD = 1  /**< a conjunction of disjunctions */
+} CMPISelectCondType;
+
+/** How grave a message for the broker's log is. */
 typedef enum _CMPISeverity {
     CMPI_SEV_ERROR = 1,
     CMPI_SEV_INFO = 2,
     CMPI_SEV_WARNING = 3,
-    CMPI_DEV_DEBUG = 4
+    CMPI_DEV_DEBUG = 4 /**< of interest to developers only */
 } CMPISeverity;
 
-typedef enum _CMPILevel {
-    CMPI_LEV_INFO = 1,
-    CMPI_LEV_WARNING = 2,
-    CMPI_LEV_VERBOSE = 3
-} CMPILevel;
+/** How detailed a message for the broker's trace is. */
+typedef enum _CMPILevel { CMPI_LEV_INFO = 1, CMPI_LEV_WARNING = 2, CMPI_LEV_VERBOSE = 3 } CMPILevel;
 
-typedef enum _CMPISelectCondType {
-    CMPI_COND_DOC = 0,
-    CMPI_COND_COD = 1
-} CMPISelectCondType;
-
+/** Where an error comes from, as the CIM schema counts it. */
 typedef enum _CMPIErrorType {
     UnknownErrorType = 0,
-    OtherErrorType = 1,
+    OtherErrorType = 1, /**< the error object names it in words */
     CommunicationsError = 2,
     QualityOfServiceError = 3,
     SoftwareError = 4,
@@ -224,6 +346,7 @@ typedef enum _CMPIErrorType {
     UnsupportedOperationError = 10
 } CMPIErrorType;
 
+/** How grave an error is to whoever reports it. */
 typedef enum _CMPIErrorSeverity {
     ErrorSevUnknown = 0,
     ErrorSevLow = 2,
@@ -232,66 +355,22 @@ typedef enum _CMPIErrorSeverity {
     ErrorSevFatal = 5
 } CMPIErrorSeverity;
 
+/**
+ * The probable cause of an error. The values are those of the CIM schema's ProbableCause, 0 to 130;
+ * those without a name here are used by their number.
+ */
 typedef enum _CMPIErrorProbableCause {
     ErrorProbCauseUnknown = 0,
-    ErrorProbCauseOther = 1,
+    ErrorProbCauseOther = 1, /**< the error object describes it */
     Unexpected_Information = 130
 } CMPIErrorProbableCause;
 
+/** How the source of an error is written. */
 typedef enum _CMPIErrorSrcFormat {
     CMPIErrSrcUnknown = 0,
-    CMPIErrSrcOther = 1,
-    CIMObjectHandle = 2
+    CMPIErrSrcOther = 1, /**< the error object names the format */
+    CIMObjectHandle = 2  /**< as an object path */
 } CMPIErrorSrcFormat;
-
-struct _CMPIValuePtr {
-    void *ptr;
-    CMPICount length;
-};
-
-union _CMPIValue {
-    CMPIUint64 uint64;
-    CMPIUint32 uint32;
-    CMPIUint16 uint16;
-    CMPIUint8 uint8;
-    CMPISint64 sint64;
-    CMPISint32 sint32;
-    CMPISint16 sint16;
-    CMPISint8 sint8;
-    CMPIReal64 real64;
-    CMPIReal32 real32;
-    CMPIBoolean boolean;
-    CMPIChar16 char16;
-    CMPIInstance *inst;
-    CMPIObjectPath *ref;
-    CMPIArgs *args;
-    CMPISelectExp *filter;
-    CMPIEnumeration *Enum;
-    CMPIArray *array;
-    CMPIString *string;
-    char *chars;
-    CMPIDateTime *dateTime;
-    CMPIValuePtr dataPtr;
-    CMPISint8 Byte;
-    CMPISint16 Short;
-    CMPISint32 Int;
-    CMPISint64 Long;
-    CMPIReal32 Float;
-    CMPIReal64 Double;
-};
-
-struct _CMPIData {
-    CMPIType type;
-    CMPIValueState state;
-    CMPIValue value;
-};
-
-struct _CMPIStatus {
-    CMPIrc rc;
-    CMPIString *msg;
-};
-
-typedef CMPIData CMPIAccessor(const char *, void *);
 
 #ifdef __cplusplus
 }
