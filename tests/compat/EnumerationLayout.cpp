@@ -1,0 +1,100 @@
+// Enumerations.
+#include "Layout.h"
+
+#include <cmpidt.h>
+
+static_assert(std::is_same_v<CMPIrc, enum _CMPIrc>);
+LAYOUT_VALUE(sizeof(CMPIrc), 4);
+LAYOUT_VALUE(CMPI_RC_OK, 0);
+LAYOUT_VALUE(CMPI_RC_ERR_FAILED, 1);
+LAYOUT_VALUE(CMPI_RC_ERR_ACCESS_DENIED, 2);
+LAYOUT_VALUE(CMPI_RC_ERR_INVALID_NAMESPACE, 3);
+LAYOUT_VALUE(CMPI_RC_ERR_INVALID_PARAMETER, 4);
+LAYOUT_VALUE(CMPI_RC_ERR_INVALID_CLASS, 5);
+LAYOUT_VALUE(CMPI_RC_ERR_NOT_FOUND, 6);
+LAYOUT_VALUE(CMPI_RC_ERR_NOT_SUPPORTED, 7);
+LAYOUT_VALUE(CMPI_RC_ERR_CLASS_HAS_CHILDREN, 8);
+LAYOUT_VALUE(CMPI_RC_ERR_CLASS_HAS_INSTANCES, 9);
+LAYOUT_VALUE(CMPI_RC_ERR_INVALID_SUPERCLASS, 10);
+LAYOUT_VALUE(CMPI_RC_ERR_ALREADY_EXISTS, 11);
+LAYOUT_VALUE(CMPI_RC_ERR_NO_SUCH_PROPERTY, 12);
+LAYOUT_VALUE(CMPI_RC_ERR_TYPE_MISMATCH, 13);
+LAYOUT_VALUE(CMPI_RC_ERR_QUERY_LANGUAGE_NOT_SUPPORTED, 14);
+LAYOUT_VALUE(CMPI_RC_ERR_INVALID_QUERY, 15);
+LAYOUT_VALUE(CMPI_RC_ERR_METHOD_NOT_AVAILABLE, 16);
+LAYOUT_VALUE(CMPI_RC_ERR_METHOD_NOT_FOUND, 17);
+LAYOUT_VALUE(CMPI_RC_DO_NOT_UNLOAD, 50);
+LAYOUT_VALUE(CMPI_RC_NEVER_UNLOAD, 51);
+LAYOUT_VALUE(CMPI_RC_ERR_INVALID_HANDLE, 60);
+LAYOUT_VALUE(CMPI_RC_ERR_INVALID_DATA_TYPE, 61);
+LAYOUT_VALUE(CMPI_RC_ERROR_SYSTEM, 100);
+LAYOUT_VALUE(CMPI_RC_ERROR, 200);
+
+static_assert(std::is_same_v<CMPIPredOp, enum _CMPIPredOp>);
+LAYOUT_VALUE(sizeof(CMPIPredOp), 4);
+LAYOUT_VALUE(CMPI_PredOp_Equals, 1);
+LAYOUT_VALUE(CMPI_PredOp_NotEquals, 2);
+LAYOUT_VALUE(CMPI_PredOp_LessThan, 3);
+LAYOUT_VALUE(CMPI_PredOp_GreaterThanOrEquals, 4);
+LAYOUT_VALUE(CMPI_PredOp_GreaterThan, 5);
+LAYOUT_VALUE(CMPI_PredOp_LessThanOrEquals, 6);
+LAYOUT_VALUE(CMPI_PredOp_Isa, 7);
+LAYOUT_VALUE(CMPI_PredOp_NotIsa, 8);
+LAYOUT_VALUE(CMPI_PredOp_Like, 9);
+LAYOUT_VALUE(CMPI_PredOp_NotLike, 10);
+LAYOUT_VALUE(CMPI_PredOp_Not_Null, 11);
+LAYOUT_VALUE(CMPI_PredOp_Null, 12);
+LAYOUT_VALUE(CMPI_PredOp_And, 13);
+LAYOUT_VALUE(CMPI_PredOp_Or, 14);
+
+static_assert(std::is_same_v<CMPISeverity, enum _CMPISeverity>);
+LAYOUT_VALUE(sizeof(CMPISeverity), 4);
+LAYOUT_VALUE(CMPI_SEV_ERROR, 1);
+LAYOUT_VALUE(CMPI_SEV_INFO, 2);
+LAYOUT_VALUE(CMPI_SEV_WARNING, 3);
+LAYOUT_VALUE(CMPI_DEV_DEBUG, 4);
+
+static_assert(std::is_same_v<CMPILevel, enum _CMPILevel>);
+LAYOUT_VALUE(sizeof(CMPILevel), 4);
+LAYOUT_VALUE(CMPI_LEV_INFO, 1);
+LAYOUT_VALUE(CMPI_LEV_WARNING, 2);
+LAYOUT_VALUE(CMPI_LEV_VERBOSE, 3);
+
+static_assert(std::is_same_v<CMPISelectCondType, enum _CMPISelectCondType>);
+LAYOUT_VALUE(sizeof(CMPISelectCondType), 4);
+LAYOUT_VALUE(CMPI_COND_DOC, 0);
+LAYOUT_VALUE(CMPI_COND_COD, 1);
+
+static_assert(std::is_same_v<CMPIErrorType, enum _CMPIErrorType>);
+LAYOUT_VALUE(sizeof(CMPIErrorType), 4);
+LAYOUT_VALUE(UnknownErrorType, 0);
+LAYOUT_VALUE(OtherErrorType, 1);
+LAYOUT_VALUE(CommunicationsError, 2);
+LAYOUT_VALUE(QualityOfServiceError, 3);
+LAYOUT_VALUE(SoftwareError, 4);
+LAYOUT_VALUE(HardwareError, 5);
+LAYOUT_VALUE(EnvironmentalError, 6);
+LAYOUT_VALUE(SecurityError, 7);
+LAYOUT_VALUE(Oversubscription_Error, 8);
+LAYOUT_VALUE(UnavailableResourceError, 9);
+LAYOUT_VALUE(UnsupportedOperationError, 10);
+
+static_assert(std::is_same_v<CMPIErrorSeverity, enum _CMPIErrorSeverity>);
+LAYOUT_VALUE(sizeof(CMPIErrorSeverity), 4);
+LAYOUT_VALUE(ErrorSevUnknown, 0);
+LAYOUT_VALUE(ErrorSevLow, 2);
+LAYOUT_VALUE(ErrorSevMedium, 3);
+LAYOUT_VALUE(ErrorSevHigh, 4);
+LAYOUT_VALUE(ErrorSevFatal, 5);
+
+static_assert(std::is_same_v<CMPIErrorProbableCause, enum _CMPIErrorProbableCause>);
+LAYOUT_VALUE(sizeof(CMPIErrorProbableCause), 4);
+LAYOUT_VALUE(ErrorProbCauseUnknown, 0);
+LAYOUT_VALUE(ErrorProbCauseOther, 1);
+LAYOUT_VALUE(Unexpected_Information, 130);
+
+static_assert(std::is_same_v<CMPIErrorSrcFormat, enum _CMPIErrorSrcFormat>);
+LAYOUT_VALUE(sizeof(CMPIErrorSrcFormat), 4);
+LAYOUT_VALUE(CMPIErrSrcUnknown, 0);
+LAYOUT_VALUE(CMPIErrSrcOther, 1);
+LAYOUT_VALUE(CIMObjectHandle, 2);
