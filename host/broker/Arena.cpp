@@ -24,6 +24,24 @@ bool Arena::releaseMark(const void* mark) {
     return true;
 }
 
+void Arena::takeFrom(Arena& other, const Object& object) {
+    if (std::unique_ptr<Object> moved = other.disown(object)) {
+        adopt(std::move(moved));
+    }
+}
+
+std::unique_ptr<Object> Arena::disown(const Object& object) {
+    const std::lock_guard<std::mutex> lock(mutex);
+    const auto found =
+        std::find_if(objects.rbegin(), objects.rend(), [&](const auto& each) { return each.get() == &object; });
+    if (found == objects.rend()) {
+        return nullptr;
+    }
+    std::unique_ptr<Object> disowned = std::move(*found);
+    objects.erase(std::next(found).base());
+    return disowned;
+}
+
 std::size_t Arena::size() const {
     const std::lock_guard<std::mutex> lock(mutex);
     return objects.size();

@@ -11,13 +11,17 @@
 namespace cimhost {
 
 /**
- * Owner of the encapsulated objects of one request on one thread: it frees them all when it goes. Objects made
- * from another object join its arena. Safe to use from several threads.
+ * Owner of the encapsulated objects of one request on one thread: it frees them all when it goes. Safe to use from
+ * several threads.
  */
 class Arena {
 public:
-    /** @param itsTables function tables that its objects point to; they must outlive the arena */
-    explicit Arena(const FunctionTables& itsTables) : tables(itsTables) {}
+    /**
+     * @param itsTables function tables that its objects point to; they must outlive the arena
+     * @param forClones where clones of its objects go, which outlive a request; null for this arena itself
+     */
+    explicit Arena(const FunctionTables& itsTables, Arena* forClones = nullptr)
+        : tables(itsTables), cloneArena(forClones == nullptr ? *this : *forClones) {}
     Arena(const Arena&) = delete;
     Arena& operator=(const Arena&) = delete;
 
@@ -39,13 +43,21 @@ public:
      */
     bool releaseMark(const void* mark);
 
+    /** Where clones of its objects go. */
+    Arena& clones() const { return cloneArena; }
+
+    /** Takes over an object of another arena, if it is there. */
+    void takeFrom(Arena& other, const Object& object);
+
     /** How many objects it holds, released ones included. */
     std::size_t size() const;
 
 private:
     void adopt(std::unique_ptr<Object> object);
+    std::unique_ptr<Object> disown(const Object& object);
 
     const FunctionTables& tables;
+    Arena& cloneArena;
     mutable std::mutex mutex;
     std::vector<std::unique_ptr<Object>> objects;
     std::vector<std::unique_ptr<std::size_t>> marks;  ///< each the number of objects at its time

@@ -17,14 +17,14 @@ CMPIStatus addArg(const CMPIArgs* args, const char* name, const CMPIValue* value
 CMPIData getArg(const CMPIArgs* args, const char* name, CMPIStatus* rc) {
     return guarded(rc, badData(), [&] {
         const auto& object = self(args);
-        return namedData(object.content->values, name, object.arena());
+        return namedData(object.content->values, name, arenaFor(object));
     });
 }
 
 CMPIData getArgAt(const CMPIArgs* args, CMPICount index, CMPIString** name, CMPIStatus* rc) {
     return guarded(rc, badData(), [&] {
         const auto& object = self(args);
-        return namedDataAt(object.content->values, index, name, object.arena());
+        return namedDataAt(object.content->values, index, name, arenaFor(object));
     });
 }
 

@@ -24,7 +24,7 @@ CMPIType getSimpleType(const CMPIArray* array, CMPIStatus* rc) {
 CMPIData getElementAt(const CMPIArray* array, CMPICount index, CMPIStatus* rc) {
     return guarded(rc, badData(), [&] {
         auto& object = self(array);
-        return dataFrom(elementAt(*object.content, index), object.content->type, object.arena());
+        return dataFrom(elementAt(*object.content, index), object.content->type, arenaFor(object));
     });
 }
 

@@ -102,7 +102,7 @@ void Broker::leave(const Arena& arena) {
 }
 
 CMPIContext* Broker::prepareThread(const ContextEntries& entries) {
-    auto arena = std::make_unique<Arena>(tables());
+    auto arena = std::make_unique<Arena>(tables(), &outside);
     auto* context = arena->make<CMPIContext>({entries});
     const std::lock_guard<std::mutex> lock(mutex);
     threads.emplace(context, std::move(arena));

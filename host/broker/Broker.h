@@ -37,8 +37,8 @@ struct BrokerOptions {
  * A CMPI broker: what providers see of the object manager.
  *
  * Objects that a provider makes belong to the innermost request of this broker on the provider's thread
- * (RequestScope), or to the attached thread; outside of both they live as long as the broker. It must outlive
- * every provider that has its handle and every request. Safe to use from several threads.
+ * (RequestScope), or to the attached thread; clones, and objects made outside of both, live as long as the broker. It
+ * must outlive every provider that has its handle and every request. Safe to use from several threads.
  */
 class Broker {
 public:
@@ -66,6 +66,9 @@ public:
 
     /** Where objects made now on this thread go. */
     Arena& arena();
+
+    /** What is not any request's: clones, and objects made outside of requests. */
+    Arena& lasting() { return outside; }
 
     /** The innermost arena of this thread, of whatever broker; null outside of requests. */
     static Arena* arenaOfThread();
@@ -95,7 +98,7 @@ public:
 private:
     BrokerOptions options;
     CMPIBroker brokerHandle;
-    Arena outside;  ///< objects made outside of requests
+    Arena outside;
     MemoryBlocks blocks;
     std::mutex mutex;
     std::map<const CMPIContext*, std::unique_ptr<Arena>> threads;  ///< by prepared context

@@ -9,14 +9,14 @@ namespace {
 CMPIData getEntry(const CMPIContext* context, const char* name, CMPIStatus* rc) {
     return guarded(rc, badData(), [&] {
         const auto& object = self(context);
-        return namedData(object.content->entries, name, object.arena());
+        return namedData(object.content->entries, name, arenaFor(object));
     });
 }
 
 CMPIData getEntryAt(const CMPIContext* context, CMPICount index, CMPIString** name, CMPIStatus* rc) {
     return guarded(rc, badData(), [&] {
         const auto& object = self(context);
-        return namedDataAt(object.content->entries, index, name, object.arena());
+        return namedDataAt(object.content->entries, index, name, arenaFor(object));
     });
 }
 

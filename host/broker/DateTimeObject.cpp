@@ -19,7 +19,7 @@ CMPIUint64 getBinaryFormat(const CMPIDateTime* time, CMPIStatus* rc) {
 CMPIString* getStringFormat(const CMPIDateTime* time, CMPIStatus* rc) {
     return guarded<CMPIString*>(rc, nullptr, [&] {
         const auto& object = self(time);
-        return object.arena().make<CMPIString>(object.content->text);
+        return arenaFor(object).make<CMPIString>(object.content->text);
     });
 }
 

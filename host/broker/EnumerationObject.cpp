@@ -12,7 +12,7 @@ CMPIData getNext(const CMPIEnumeration* enumeration, CMPIStatus* rc) {
         if (from.taken >= from.elements.size()) {
             throw Failure(CMPI_RC_ERR_FAILED, "The enumeration has no more elements.");
         }
-        return dataFrom(from.elements[from.taken++], from.type, object.arena());
+        return dataFrom(from.elements[from.taken++], from.type, arenaFor(object));
     });
 }
 
@@ -27,7 +27,7 @@ CMPIBoolean hasNext(const CMPIEnumeration* enumeration, CMPIStatus* rc) {
 CMPIArray* toArray(const CMPIEnumeration* enumeration, CMPIStatus* rc) {
     return guarded<CMPIArray*>(rc, nullptr, [&] {
         const auto& object = self(enumeration);
-        return object.arena().make<CMPIArray>({object.content->type, object.content->elements});
+        return arenaFor(object).make<CMPIArray>({object.content->type, object.content->elements});
     });
 }
 

@@ -20,7 +20,7 @@ CMPIString* getText(const CMPIError* error, CMPIStatus* rc) {
     return guarded<CMPIString*>(rc, nullptr, [&]() -> CMPIString* {
         const auto& object = self(error);
         const std::optional<std::string>& text = (*object.content).*member;
-        return text ? object.arena().make<CMPIString>(*text) : nullptr;
+        return text ? arenaFor(object).make<CMPIString>(*text) : nullptr;
     });
 }
 
@@ -39,7 +39,7 @@ CMPIArray* getTexts(const CMPIError* error, CMPIStatus* rc) {
         if (!texts) {
             return nullptr;
         }
-        return object.arena().make<CMPIArray>({CMPI_string, {texts->begin(), texts->end()}});
+        return arenaFor(object).make<CMPIArray>({CMPI_string, {texts->begin(), texts->end()}});
     });
 }
 

@@ -73,7 +73,7 @@ CMPIData asProperty(CMPIData data, const InstanceContent& instance, const std::s
 CMPIData getProperty(const CMPIInstance* instance, const char* name, CMPIStatus* rc) {
     return guarded(rc, badData(), [&] {
         const auto& object = self(instance);
-        const CMPIData data = namedData(object.content->value.properties, name, object.arena());
+        const CMPIData data = namedData(object.content->value.properties, name, arenaFor(object));
         return asProperty(data, *object.content, name);
     });
 }
@@ -82,7 +82,7 @@ CMPIData getPropertyAt(const CMPIInstance* instance, CMPICount index, CMPIString
     return guarded(rc, badData(), [&] {
         const auto& object = self(instance);
         const auto& properties = object.content->value.properties;
-        const CMPIData data = namedDataAt(properties, index, name, object.arena());
+        const CMPIData data = namedDataAt(properties, index, name, arenaFor(object));
         return asProperty(data, *object.content, properties[index].name);
     });
 }
@@ -94,7 +94,7 @@ CMPICount getPropertyCount(const CMPIInstance* instance, CMPIStatus* rc) {
 CMPIObjectPath* getObjectPath(const CMPIInstance* instance, CMPIStatus* rc) {
     return guarded<CMPIObjectPath*>(rc, nullptr, [&] {
         const auto& object = self(instance);
-        return object.arena().make<CMPIObjectPath>(object.content->value.path);
+        return arenaFor(object).make<CMPIObjectPath>(object.content->value.path);
     });
 }
 

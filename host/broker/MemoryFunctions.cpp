@@ -1,7 +1,7 @@
 #include <cstring>
 
-#include "broker/Boundary.h"
 #include "broker/Broker.h"
+#include "broker/Encapsulation.h"
 #include "broker/Tables.h"
 
 // CMPIBrokerMemFT: marks, plain memory, and freeing objects before their request ends.
@@ -50,10 +50,9 @@ void cmpiFree(const CMPIBroker* broker, void* block) {
 
 template <class Handle>
 void freeObject(const CMPIBroker* broker, Handle* handle) {
-    guarded([&] {
-        Broker::of(broker);
-        self(handle).release();
-    });
+    if (guarded([&] { Broker::of(broker); }).rc == CMPI_RC_OK) {
+        releaseObject(handle);
+    }
 }
 
 /** Nobody has one: queries are not supported. */

@@ -1,6 +1,5 @@
 #include "broker/Messages.h"
 
-#include <cstdarg>
 #include <string>
 #include <vector>
 
@@ -64,7 +63,9 @@ std::string message(const char* text, CMPICount count, va_list list) {
     return expanded(unexpanded, inserts);
 }
 
-CMPIString* newMessage(const CMPIBroker* broker, const char* text, CMPIStatus* rc, CMPICount count, va_list list) {
+}  // namespace
+
+CMPIString* messageFromList(const CMPIBroker* broker, const char* text, CMPIStatus* rc, CMPICount count, va_list list) {
     CMPIString* result = guarded<CMPIString*>(
         rc, nullptr, [&] { return Broker::of(broker).arena().make<CMPIString>(message(text, count, list)); });
     if (result == nullptr && text != nullptr) {
@@ -74,13 +75,11 @@ CMPIString* newMessage(const CMPIBroker* broker, const char* text, CMPIStatus* r
     return result;
 }
 
-}  // namespace
-
 CMPIString* getMessage(const CMPIBroker* broker, const char*, const char* defaultTemplate, CMPIStatus* rc,
                        CMPICount count, ...) {
     va_list list;
     va_start(list, count);
-    CMPIString* result = newMessage(broker, defaultTemplate, rc, count, list);
+    CMPIString* result = messageFromList(broker, defaultTemplate, rc, count, list);
     va_end(list);
     return result;
 }
@@ -89,7 +88,7 @@ CMPIString* getMessage2(const CMPIBroker* broker, const char*, const CMPIMsgFile
                         CMPIStatus* rc, CMPICount count, ...) {
     va_list list;
     va_start(list, count);
-    CMPIString* result = newMessage(broker, defaultTemplate, rc, count, list);
+    CMPIString* result = messageFromList(broker, defaultTemplate, rc, count, list);
     va_end(list);
     return result;
 }

@@ -2,6 +2,8 @@
 
 #include <cmpift.h>
 
+#include <cstdarg>
+
 namespace cimhost {
 
 /** @name Messages with inserts
@@ -14,6 +16,10 @@ CMPIString* getMessage(const CMPIBroker* broker, const char* id, const char* def
                        CMPICount count, ...);
 CMPIString* getMessage2(const CMPIBroker* broker, const char* id, const CMPIMsgFileHandle file,
                         const char* defaultTemplate, CMPIStatus* rc, CMPICount count, ...);
+
+/** Both of them, with the inserts as a list. */
+CMPIString* messageFromList(const CMPIBroker* broker, const char* defaultTemplate, CMPIStatus* rc, CMPICount count,
+                            va_list inserts);
 ///@}
 
 }  // namespace cimhost

@@ -17,10 +17,11 @@ public:
     Object(const Object&) = delete;
     Object& operator=(const Object&) = delete;
 
+    /** The arena that it was made in. */
     Arena& arena() const { return owner; }
     ObjectKind kind() const { return kindOf; }
 
-    /** Clones outlive the release of a mark. */
+    /** Clones live until somebody releases them: they outlive requests and marks. */
     bool isClone = false;
 
 private:
@@ -30,7 +31,7 @@ private:
 
 /**
  * An encapsulated object: the handle that the provider sees and what it stands for. After a release the content is
- * gone; the handle stays, pointing to nothing, until the arena goes, so that a use after release is told, not fatal.
+ * gone; the handle stays, pointing to nothing, until the request ends, so that a use after release is told, not fatal.
  */
 template <class Handle>
 class Encapsulated final : public Object {

@@ -16,7 +16,7 @@ template <std::string ObjectPath::*part>
 CMPIString* getPart(const CMPIObjectPath* path, CMPIStatus* rc) {
     return guarded<CMPIString*>(rc, nullptr, [&] {
         const auto& object = self(path);
-        return object.arena().make<CMPIString>((*object.content).*part);
+        return arenaFor(object).make<CMPIString>((*object.content).*part);
     });
 }
 
@@ -40,14 +40,14 @@ CMPIData asKey(CMPIData data) {
 CMPIData getKey(const CMPIObjectPath* path, const char* name, CMPIStatus* rc) {
     return guarded(rc, badData(), [&] {
         const auto& object = self(path);
-        return asKey(namedData(object.content->keys, name, object.arena()));
+        return asKey(namedData(object.content->keys, name, arenaFor(object)));
     });
 }
 
 CMPIData getKeyAt(const CMPIObjectPath* path, CMPICount index, CMPIString** name, CMPIStatus* rc) {
     return guarded(rc, badData(), [&] {
         const auto& object = self(path);
-        return asKey(namedDataAt(object.content->keys, index, name, object.arena()));
+        return asKey(namedDataAt(object.content->keys, index, name, arenaFor(object)));
     });
 }
 
@@ -98,7 +98,7 @@ CMPIData getParameterQualifier(const CMPIObjectPath* path, const char*, const ch
 CMPIString* toString(const CMPIObjectPath* path, CMPIStatus* rc) {
     return guarded<CMPIString*>(rc, nullptr, [&] {
         const auto& object = self(path);
-        return object.arena().make<CMPIString>(formatObjectPath(*object.content));
+        return arenaFor(object).make<CMPIString>(formatObjectPath(*object.content));
     });
 }
 

@@ -2,7 +2,7 @@
 
 namespace cimhost {
 
-RequestScope::RequestScope(Broker& itsBroker) : broker(itsBroker), objects(itsBroker.tables()) {
+RequestScope::RequestScope(Broker& itsBroker) : broker(itsBroker), objects(itsBroker.tables(), &itsBroker.lasting()) {
     broker.enter(objects);
 }
 

@@ -9,6 +9,14 @@ ResultEvents& events(const CMPIResult* result) {
     return *content(result).events;
 }
 
+/** What a result collects belongs to its request, so nothing of it can outlive that. */
+CMPIResult* cloneResult(const CMPIResult* result, CMPIStatus* rc) {
+    return guarded<CMPIResult*>(rc, nullptr, [&]() -> CMPIResult* {
+        self(result);
+        throw Failure(CMPI_RC_ERR_NOT_SUPPORTED);
+    });
+}
+
 CMPIStatus returnData(const CMPIResult* result, const CMPIValue* value, const CMPIType type) {
     return guarded([&] {
         ResultEvents& target = events(result);
@@ -43,14 +51,7 @@ CMPIStatus returnError(const CMPIResult* result, const CMPIError* error) {
 
 }  // namespace
 
-/** A clone of a result collects into the same events. */
-const CMPIResultFT resultTable{tableVersion,
-                               releaseObject<CMPIResult>,
-                               cloneObject<CMPIResult>,
-                               returnData,
-                               returnInstance,
-                               returnObjectPath,
-                               returnDone,
-                               returnError};
+const CMPIResultFT resultTable{tableVersion,   releaseObject<CMPIResult>, cloneResult, returnData,
+                               returnInstance, returnObjectPath,          returnDone,  returnError};
 
 }  // namespace cimhost

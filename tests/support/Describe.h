@@ -1,0 +1,79 @@
+#pragma once
+
+#include <cmpift.h>
+
+#include <optional>
+#include <string>
+#include <type_traits>
+#include <vector>
+
+// Arguments of CMPI calls as text.
+
+namespace testsupport {
+
+/** Whether the type is a handle that points to a function table. */
+template <class Type>
+constexpr bool isHandle =
+    std::is_same_v<Type, CMPIBroker> || std::is_same_v<Type, CMPIString> || std::is_same_v<Type, CMPIObjectPath> ||
+    std::is_same_v<Type, CMPIInstance> || std::is_same_v<Type, CMPIDateTime> || std::is_same_v<Type, CMPIArray> ||
+    std::is_same_v<Type, CMPIEnumeration> || std::is_same_v<Type, CMPIArgs> || std::is_same_v<Type, CMPIContext> ||
+    std::is_same_v<Type, CMPIResult> || std::is_same_v<Type, CMPIError>;
+
+template <class Type>
+constexpr bool hasTable = std::is_pointer_v<Type>&& isHandle<std::remove_const_t<std::remove_pointer_t<Type>>>;
+
+/** What is known of a call's value argument while its arguments are gone through. */
+struct ValueArgument {
+    const CMPIValue* value = nullptr;
+    std::optional<std::size_t> position{};  ///< of its text among the texts
+};
+
+/** The texts of a call's arguments; those that say nothing add none. */
+class Description {
+public:
+    void add(const char* text);
+    void add(const char** names);
+    void add(const CMPIObjectPath* path);
+    void add(const CMPIInstance* instance);
+    void add(const CMPIString* string);
+    void add(const CMPIValue* value);
+    void add(CMPIType type);  ///< with a value before it, this makes the value readable
+    void add(CMPIBoolean flag) { texts.push_back(std::to_string(flag)); }
+    void add(int number) { texts.push_back(std::to_string(number)); }
+    void add(CMPICount number) { texts.push_back(std::to_string(number)); }
+    void add(CMPIUint64 number) { texts.push_back(std::to_string(number)); }
+
+    /** Anything else: pointers for output, brokers, contexts... */
+    template <class Other>
+    void add(const Other& argument) {
+        using Plain = std::remove_const_t<std::remove_pointer_t<Other>>;
+        if constexpr (std::is_same_v<Plain, CMPIObjectPath> || std::is_same_v<Plain, CMPIInstance> ||
+                      std::is_same_v<Plain, CMPIString>) {
+            add(static_cast<const Plain*>(argument));
+        } else if constexpr (std::is_enum_v<Other>) {
+            add(static_cast<int>(argument));
+        }
+    }
+
+    std::vector<std::string> texts;
+
+private:
+    ValueArgument pending;
+};
+
+/** The texts of all arguments but the first when that is the object of the call. */
+template <class First, class... Others>
+std::vector<std::string> describeAll(const First& first, const Others&... others) {
+    Description description;
+    if constexpr (!hasTable<First>) {
+        description.add(first);
+    }
+    (description.add(others), ...);
+    return description.texts;
+}
+
+inline std::vector<std::string> describeAll() {
+    return {};
+}
+
+}  // namespace testsupport

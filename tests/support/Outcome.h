@@ -1,0 +1,33 @@
+#pragma once
+
+#include <cmpidt.h>
+
+#include <string>
+#include <utility>
+#include <vector>
+
+#include "model/ResultEvent.h"
+#include "operations/Request.h"
+
+namespace testsupport {
+
+/** Everything that a provider did in answer to one call. */
+struct Outcome {
+    CMPIrc rc = CMPI_RC_OK;
+    bool hasMessage = false;         ///< whether the status' message pointer was not null
+    std::string message{};           ///< its text
+    bool threw = false;              ///< an exception left the provider; rc is then CMPI_RC_ERR_FAILED
+    cimhost::ResultEvents events{};  ///< what it returned, in order
+    int doneCount = 0;               ///< how often it called returnDone
+
+    std::vector<cimhost::Instance> instances() const { return cimhost::eventsOf<cimhost::Instance>(events); }
+    std::vector<cimhost::ObjectPath> paths() const { return cimhost::eventsOf<cimhost::ObjectPath>(events); }
+};
+
+inline Outcome outcomeOf(cimhost::RawAnswer answer) {
+    const int done = answer.doneCount();
+    return {answer.status.rc, answer.hasMessage,        std::move(answer.status.message),
+            answer.threw,     std::move(answer.events), done};
+}
+
+}  // namespace testsupport
