@@ -7,18 +7,6 @@
 
 namespace agentEnvironment {
 
-const char* const oneComputer = R"(
-[[instrumentation.node]]
-type = 1
-path = "/system"
-properties = { "36" = "Example Maker", "108" = "testhost" }
-
-[[instrumentation.node]]
-type = 40
-path = "/system/computer"
-properties = { "36" = "Example Maker", "39" = "Model X - Tower", "108" = "testhost" }
-)";
-
 namespace {
 
 namespace fs = std::filesystem;

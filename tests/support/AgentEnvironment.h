@@ -17,7 +17,17 @@ extern const char* const agentNodes;
 namespace agentEnvironment {
 
 /** One computer, named "testhost", whose product is "Model X - Tower" by "Example Maker". */
-extern const char* const oneComputer;
+constexpr const char* oneComputer = R"(
+[[instrumentation.node]]
+type = 1
+path = "/system"
+properties = { "36" = "Example Maker", "108" = "testhost" }
+
+[[instrumentation.node]]
+type = 40
+path = "/system/computer"
+properties = { "36" = "Example Maker", "39" = "Model X - Tower", "108" = "testhost" }
+)";
 
 std::filesystem::path directory();      ///< all below is in here
 std::filesystem::path dataDirectory();  ///< with Lease.dat, Warranty.dat, asset.dat

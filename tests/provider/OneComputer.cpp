@@ -1,0 +1,3 @@
+#include "support/AgentEnvironment.h"
+
+const char* const agentNodes = agentEnvironment::oneComputer;

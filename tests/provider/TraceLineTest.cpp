@@ -1,0 +1,237 @@
+#include "Trace.h"
+
+#include "Exceptions.h"
+#include "Support.h"
+
+#include <gmock/gmock.h>
+
+namespace {
+
+using namespace KO;
+using namespace providerTest;
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+const std::string loggerOfTest("Test.Logger");
+const TraceUnit unit{loggerOfTest, "TraceLineTest.cpp"};
+
+class TraceLine : public CleanAgent {};
+
+TEST_F(TraceLine, GoesToTheLogChannelAndThenToTheTraceChannel) {
+    traceMessage({&unit, Level::error, "aFunction", 17}, "a text");
+    const auto records = agentEnvironment::log();
+    ASSERT_EQ(records.size(), 2U);
+    EXPECT_EQ(records[0].channel, "log");
+    EXPECT_EQ(records[1].channel, "trace");
+    for (const auto& record : records) {
+        EXPECT_EQ(record.level, 3000);
+        EXPECT_EQ(record.logger, "Test.Logger");
+        EXPECT_EQ(record.function, "aFunction");
+        EXPECT_EQ(record.file, "TraceLineTest.cpp");
+        EXPECT_EQ(record.line, 17);
+        EXPECT_EQ(record.text, "MESSAGE [File: TraceLineTest.cpp, Line: 17]: a text");
+    }
+}
+
+TEST_F(TraceLine, KnowsItsFunctionAndLineFromThePlaceOfTheCall) {
+    traceMethod(at(unit));
+    const unsigned int line = __LINE__ - 1;
+    const auto records = agentEnvironment::log();
+    ASSERT_EQ(records.size(), 2U);
+    EXPECT_EQ(records[0].function, "TestBody");
+    EXPECT_EQ(records[0].line, static_cast<int>(line));
+    EXPECT_EQ(records[0].text,
+              "METHOD: TestBody() was invoked in TraceLineTest.cpp [Line: " + std::to_string(line) + "]");
+    EXPECT_EQ(records[0].level, 4000);
+}
+
+TEST_F(TraceLine, KeepsControlCharactersOfATextFromForgingRecords) {
+    traceVariable(at(unit), "value", std::string("one\ntwo\tthree"));
+    EXPECT_THAT(texts(), ElementsAre(variable("value", "one\\ntwo\\tthree", "TraceLineTest.cpp")));
+}
+
+TEST_F(TraceLine, ShowsAFlagAsANumber) {
+    traceVariable(at(unit), "flag", true);
+    EXPECT_THAT(texts(), ElementsAre(variable("flag", "1", "TraceLineTest.cpp")));
+}
+
+TEST_F(TraceLine, IsLostWithoutHarmWhenItsLevelIsNotAdmitted) {
+    traceMessage({&unit, 10000, "aFunction", 1}, "a text");
+    EXPECT_THAT(agentEnvironment::log(), IsEmpty());
+}
+
+TEST_F(TraceLine, IsCutAt511Characters) {
+    const std::string longList(600, 'x');
+    traceLine({&unit, Level::flow, "f", 1}, MT_ENTERING, label::value, longList);
+    const auto shown = texts();
+    ASSERT_EQ(shown.size(), 1U);
+    const std::string head = "ENTERING: f() in TraceLineTest.cpp [Line: 1],Parameters List:  value=";
+    const auto records = agentEnvironment::log();
+    EXPECT_EQ(records[0].text, head + std::string(511 - head.size(), 'x'));
+    EXPECT_EQ(records[1].text, records[0].text);
+}
+
+enum class Colour : int { green = 6 };
+
+TEST_F(TraceLine, ShowsTheValuesOfAParameterListBehindTheirLabels) {
+    traceLine(at(unit), MT_MESSAGE, label::property, Colour::green, label::value, std::string("a b"), label::instanceId,
+              "text", label::filterTypeBare, 4294967295U);
+    EXPECT_THAT(texts(), ElementsAre("MESSAGE [File: TraceLineTest.cpp, Line: N]: TestBody,Parameters List:  "
+                                     "property=6 value=a b instanceId=textFilterType=4294967295"));
+}
+
+TEST_F(TraceLine, ShowsAPointerAsAnAddress) {
+    const int target = 0;
+    const void* const nothing = nullptr;
+    traceLine(at(unit), MT_ENTERING, label::broker, &target, label::context, nothing);
+    std::ostringstream address;
+    address << &target;
+    EXPECT_THAT(texts(),
+                ElementsAre(entering("TestBody", "TraceLineTest.cpp", " _broker=" + address.str() + " _context=0")));
+}
+
+void leaveNormally() {
+    const Traced traced(at(unit));
+    traceMethod(at(unit));
+}
+
+TEST_F(TraceLine, MarksEntryAndExitOfAFunction) {
+    leaveNormally();
+    EXPECT_THAT(texts(), ElementsAre(entering("leaveNormally", "TraceLineTest.cpp"),
+                                     "METHOD: leaveNormally() was invoked in TraceLineTest.cpp [Line: N]",
+                                     exiting("leaveNormally", "TraceLineTest.cpp")));
+    EXPECT_EQ(texts("trace"), texts("log"));
+}
+
+void change(std::string& value) {
+    const Traced traced(at(unit, Level::error), label::value, value);
+    value = "after";
+}
+
+TEST_F(TraceLine, ReadsTheParametersAgainAtExit) {
+    std::string value = "before";
+    change(value);
+    EXPECT_THAT(texts(), ElementsAre(entering("change", "TraceLineTest.cpp", " value=before"),
+                                     exiting("change", "TraceLineTest.cpp", " value=after")));
+    EXPECT_EQ(agentEnvironment::log().back().level, 3000);
+}
+
+void nameAsGiven() {
+    const Traced traced(at(unit, Level::flow, "~Name"), label::value, std::string("kept until the exit"));
+}
+
+TEST_F(TraceLine, KeepsTemporaryParametersUntilTheExit) {
+    nameAsGiven();
+    EXPECT_THAT(texts(), ElementsAre(entering("~Name", "TraceLineTest.cpp", " value=kept until the exit"),
+                                     exiting("~Name", "TraceLineTest.cpp", " value=kept until the exit")));
+}
+
+void leaveByException() {
+    const Traced traced(at(unit));
+    fail<FrameworkException>(at(unit), "It failed.");
+}
+
+TEST_F(TraceLine, MarksNoExitWhenAnExceptionLeaves) {
+    EXPECT_EQ(thrown<FrameworkException>(leaveByException), "It failed.");
+    EXPECT_THAT(texts(), ElementsAre(entering("leaveByException", "TraceLineTest.cpp"),
+                                     message("It failed.", "TraceLineTest.cpp")));
+}
+
+void swallow() {
+    const Traced traced(at(unit));
+    try {
+        throw ProviderException("swallowed");
+    } catch (const ProviderException&) {
+        return;
+    }
+}
+
+TEST_F(TraceLine, MarksTheExitOfAFunctionThatCatchesAnException) {
+    swallow();
+    EXPECT_THAT(texts(),
+                ElementsAre(entering("swallow", "TraceLineTest.cpp"), exiting("swallow", "TraceLineTest.cpp")));
+}
+
+struct TracedAtDestruction {
+    ~TracedAtDestruction() { leaveNormally(); }
+};
+
+TEST_F(TraceLine, MarksTheExitOfAFunctionThatRunsWhileAnExceptionLeaves) {
+    try {
+        const TracedAtDestruction leaving;
+        throw ProviderException("on its way");
+    } catch (const ProviderException&) {
+    }
+    EXPECT_THAT(texts(), testing::Contains(exiting("leaveNormally", "TraceLineTest.cpp")));
+}
+
+TEST_F(TraceLine, TellsAFailureAtErrorLevelBeforeItIsThrown) {
+    EXPECT_EQ(thrown<InstrumentationException>(
+                  [] { fail<InstrumentationException>(at(unit, Level::flow, "find"), "Not there"); }),
+              "Not there");
+    const auto records = recordsOf("TraceLineTest.cpp", "find");
+    ASSERT_EQ(records.size(), 1U);
+    EXPECT_EQ(records[0].level, 3000);
+    EXPECT_EQ(withoutLine(records[0].text), message("Not there", "TraceLineTest.cpp"));
+}
+
+struct Marker {
+    const char* channel;
+    const char* function;
+    int line;
+    std::string text;
+};
+
+void expectMarkers(const std::vector<Marker>& expected) {
+    const auto records = agentEnvironment::log();
+    ASSERT_EQ(records.size(), expected.size());
+    for (std::size_t index = 0; index < expected.size(); ++index) {
+        SCOPED_TRACE(index);
+        EXPECT_EQ(records[index].channel, expected[index].channel);
+        EXPECT_EQ(records[index].level, 4000);
+        EXPECT_EQ(records[index].logger, "Test.Logger");
+        EXPECT_EQ(records[index].function, expected[index].function);
+        EXPECT_EQ(records[index].file, "sdk/kolib/include/Trace.h");
+        EXPECT_EQ(records[index].line, expected[index].line);
+        EXPECT_EQ(records[index].text, expected[index].text);
+    }
+}
+
+const std::string rule(78, '=');
+
+TEST_F(TraceLine, MarksTheEntryOfARequestWithARuleAndTheEnteringLine) {
+    markProviderEntry(loggerOfTest, "LeaseAndWarranty_GetInstance", "Entry.cpp", 41);
+    const std::string line = "ENTERING: LeaseAndWarranty_GetInstance() in Entry.cpp [Line: 41]";
+    expectMarkers({{"log", "markProviderEntry", 336, rule},
+                   {"trace", "markProviderEntry", 336, rule},
+                   {"log", "markProviderEntry", 337, line},
+                   {"trace", "markProviderEntry", 337, line}});
+}
+
+TEST_F(TraceLine, MarksTheExitOfARequestWithTheExitingLineAndARule) {
+    markProviderExit(loggerOfTest, "LeaseAndWarranty_GetInstance", "Entry.cpp", 41);
+    const std::string line = "EXITING: LeaseAndWarranty_GetInstance() in Entry.cpp [Line: 41]";
+    expectMarkers({{"log", "markProviderExit", 348, line},
+                   {"trace", "markProviderExit", 348, line},
+                   {"log", "markProviderExit", 349, rule},
+                   {"trace", "markProviderExit", 349, rule}});
+}
+
+template <class Exception>
+class ThrownMessage : public testing::Test {};
+
+using ExceptionClasses = testing::Types<InstrumentationException, FrameworkException, ProviderException>;
+TYPED_TEST_SUITE(ThrownMessage, ExceptionClasses);
+
+TYPED_TEST(ThrownMessage, IsWhatTheExceptionAndItsCopiesSay) {
+    std::string text = "Lease record not available";
+    const TypeParam original(text.c_str());
+    text = "something else";
+    const TypeParam copy(original);
+    EXPECT_STREQ(original.what(), "Lease record not available");
+    EXPECT_STREQ(copy.what(), "Lease record not available");
+    EXPECT_EQ(thrown<std::exception>([&] { throw TypeParam(copy); }), "Lease record not available");
+    static_assert(std::is_base_of_v<std::exception, TypeParam>);
+}
+
+}  // namespace
