@@ -1,0 +1,86 @@
+# What the scripts share: where the project is, and the packages they need. Sourced, not run.
+# shellcheck shell=bash
+
+root=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
+cd "$root" || exit 1
+
+heading() {
+    printf '\n=== %s\n' "$*"
+}
+
+fail() {
+    printf '%s: %s\n' "${0##*/}" "$*" >&2
+    exit 1
+}
+
+# Prints the comment at the head of the running script, which is its description.
+usage() {
+    sed -n '2,/^[^#]/{s/^# \{0,1\}//p}' "$0"
+}
+
+# For scripts without arguments of their own: prints the help, or refuses what was given.
+refuse_arguments() {
+    [ $# -eq 0 ] && return
+    case $1 in
+    -h | --help)
+        usage
+        exit 0
+        ;;
+    esac
+    printf '%s: unknown argument: %s\nTry %s --help.\n' "${0##*/}" "$1" "$0" >&2
+    exit 2
+}
+
+# The packages of some stages that are not installed, one a line.
+missing_packages() {
+    local stage package
+    for stage in "$@"; do
+        awk -v stage="$stage" '$1 !~ /^#/ && $2 == stage { print $1 }' "$root/script/packages"
+    done | sort -u | while read -r package; do
+        dpkg-query -W -f='${db:Status-Status}\n' "$package" 2>/dev/null | grep -qx installed || echo "$package"
+    done
+}
+
+as_root() {
+    if [ "$(id -u)" -eq 0 ]; then
+        "$@"
+    elif command -v sudo >/dev/null && { [ -t 0 ] || sudo -n true 2>/dev/null; }; then
+        sudo "$@"
+    else
+        return 1
+    fi
+}
+
+# Installs what stages need and the system lacks. Without anything to install, nobody has to be root.
+install_packages() {
+    local packages
+    command -v dpkg-query >/dev/null || fail "this system has no dpkg; script/packages lists what the build needs"
+    mapfile -t packages < <(missing_packages "$@")
+    [ "${#packages[@]}" -gt 0 ] || return 0
+    heading "Installing ${packages[*]}"
+    if ! as_root true; then
+        fail "packages are missing, and neither root nor sudo is at hand to install them. Install by hand:
+    apt-get install --no-install-recommends ${packages[*]}"
+    fi
+    as_root apt-get update -qq
+    as_root env DEBIAN_FRONTEND=noninteractive apt-get install -y -qq --no-install-recommends "${packages[@]}"
+}
+
+# build PRESET [TARGET...]: configures a preset and builds it, or only some of its targets.
+build() {
+    local preset=$1
+    shift
+    heading "Building preset $preset"
+    cmake --preset "$preset"
+    cmake --build --preset "$preset" --parallel "$(nproc)" ${1:+--target "$@"}
+}
+
+# The C and C++ files of the project, each ended by a null character.
+source_files() {
+    git ls-files -z -- '*.h' '*.hpp' '*.c' '*.cpp'
+}
+
+# The shell scripts of the project, likewise.
+shell_scripts() {
+    git ls-files -z | xargs -0 awk 'FNR == 1 && /^#!.*sh$|shellcheck shell=/ { printf "%s%c", FILENAME, 0 } FNR > 2 { nextfile }'
+}
