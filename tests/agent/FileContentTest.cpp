@@ -1,0 +1,46 @@
+#include "configuration/FileContent.h"
+
+#include "agent/TemporaryDirectory.h"
+
+#include <gtest/gtest.h>
+#include <sys/stat.h>
+
+#include <cerrno>
+
+using Agent::FileContent;
+using Agent::readFile;
+using agent_test::TemporaryDirectory;
+
+TEST(FileContent, ReadsAWholeFile) {
+    const TemporaryDirectory directory;
+    const std::string text = std::string(100000, 'x') + '\0' + "end";
+    const FileContent content = readFile(directory.write("file", text));
+    EXPECT_EQ(content.error, 0);
+    EXPECT_EQ(content.text, text);
+}
+
+TEST(FileContent, TellsAbsentFromUnreadable) {
+    const TemporaryDirectory directory;
+    EXPECT_TRUE(readFile(directory.file("nothing")).absent());
+    EXPECT_TRUE(readFile(directory.write("file", "") + "/below").absent());
+
+    const FileContent ofDirectory = readFile(directory.path());
+    EXPECT_EQ(ofDirectory.error, EISDIR);
+    EXPECT_FALSE(ofDirectory.absent());
+}
+
+TEST(FileContent, DoesNotWaitForThePartnerOfAPipe) {
+    const TemporaryDirectory directory;
+    ASSERT_EQ(::mkfifo(directory.file("pipe").c_str(), 0600), 0);
+    EXPECT_EQ(readFile(directory.file("pipe")).text, "");
+}
+
+TEST(FileContent, RefusesAFileWithoutEnd) {
+    EXPECT_EQ(readFile("/dev/zero").error, EFBIG);
+}
+
+TEST(FileContent, RefusesAPathWithANulCharacter) {
+    const TemporaryDirectory directory;
+    directory.write("file", "content");
+    EXPECT_EQ(readFile(directory.file("file") + '\0' + "more").error, EINVAL);
+}

@@ -1,0 +1,48 @@
+#include "logging/Levels.h"
+
+#include <gtest/gtest.h>
+
+#include <string>
+
+using RZLog::Channel;
+using RZLog::Levels;
+
+TEST(Levels, AdmitByDefaultWhatIsNotAboveTheErrorLevel) {
+    const Levels levels;
+    for (const Channel channel : {Channel::Log, Channel::Trace}) {
+        EXPECT_TRUE(levels.admit(channel, "any", 3000));
+        EXPECT_FALSE(levels.admit(channel, "any", 3001));
+    }
+}
+
+TEST(Levels, OfAChannelDoNotTouchTheOther) {
+    Levels levels;
+    levels.setDefault({4000, 0});
+    EXPECT_TRUE(levels.admit(Channel::Log, "any", 4000));
+    EXPECT_FALSE(levels.admit(Channel::Trace, "any", 3000));
+}
+
+TEST(Levels, OfALoggerHoldForItsExactNameOnly) {
+    Levels levels;
+    ASSERT_TRUE(levels.set("Ostrel.One", {6000, 100}));
+    EXPECT_TRUE(levels.admit(Channel::Log, "Ostrel.One", 6000));
+    EXPECT_FALSE(levels.admit(Channel::Trace, "Ostrel.One", 3000));
+    for (const char* other : {"Ostrel.one", "Ostrel.One.Two", "Ostrel.On", ""}) {
+        EXPECT_FALSE(levels.admit(Channel::Log, other, 6000)) << other;
+        EXPECT_TRUE(levels.admit(Channel::Trace, other, 3000)) << other;
+    }
+}
+
+TEST(Levels, HaveRoomForSixtyFourLoggersWithNamesOfModestLength) {
+    Levels levels;
+    EXPECT_FALSE(levels.set(std::string(128, 'x'), {}));
+    EXPECT_TRUE(levels.set(std::string(127, 'x'), {9, 9}));
+    for (int number = 1; number < 64; ++number) {
+        EXPECT_TRUE(levels.set("logger" + std::to_string(number), {number, 0}));
+    }
+    EXPECT_FALSE(levels.set("one too many", {9, 9}));
+    EXPECT_TRUE(levels.admit(Channel::Log, std::string(127, 'x'), 9));
+    EXPECT_FALSE(levels.admit(Channel::Log, std::string(127, 'x'), 10));
+    EXPECT_TRUE(levels.admit(Channel::Log, "logger63", 63));
+    EXPECT_FALSE(levels.admit(Channel::Log, "logger63", 64));
+}

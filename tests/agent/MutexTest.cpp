@@ -1,0 +1,98 @@
+#include "KO/Mutex.h"
+
+#include "Exceptions.h"
+
+#include <gmock/gmock.h>
+
+#include <thread>
+
+using KO::FrameworkException;
+using KO::Mutex;
+
+namespace {
+
+constexpr unsigned long withoutLimit = 0xFFFFFFFF;
+
+/** Whether another thread can have the mutex at once. */
+bool isFree(Mutex& mutex) {
+    bool taken = false;
+    std::thread([&mutex, &taken] {
+        try {
+            mutex.lock(0);
+            mutex.unlock();
+            taken = true;
+        } catch (const FrameworkException&) {
+        }
+    }).join();
+    return taken;
+}
+
+}  // namespace
+
+TEST(Mutex, KeepsOtherThreadsOutUntilItIsUnlocked) {
+    Mutex mutex;
+    EXPECT_TRUE(isFree(mutex));
+    mutex.lock(withoutLimit);
+    EXPECT_FALSE(isFree(mutex));
+    mutex.unlock();
+    EXPECT_TRUE(isFree(mutex));
+}
+
+TEST(Mutex, MayBeTakenWithATimeLimit) {
+    Mutex mutex;
+    mutex.lock(60000);
+    EXPECT_FALSE(isFree(mutex));
+    mutex.unlock();
+    EXPECT_TRUE(isFree(mutex));
+}
+
+TEST(Mutex, SaysThatTheTimeIsOver) {
+    Mutex mutex;
+    mutex.lock(withoutLimit);
+    std::string message;
+    std::thread([&mutex, &message] {
+        try {
+            mutex.lock(1);
+        } catch (const FrameworkException& failure) {
+            message = failure.what();
+        }
+    }).join();
+    EXPECT_EQ(message, "Mutex cannot be locked: Connection timed out");
+    mutex.unlock();
+}
+
+TEST(Mutex, RefusesASecondLockOfOneThreadInsteadOfWaitingForever) {
+    Mutex mutex;
+    mutex.lock(withoutLimit);
+    EXPECT_THROW(mutex.lock(withoutLimit), FrameworkException);
+    EXPECT_FALSE(isFree(mutex));
+    mutex.unlock();
+    EXPECT_TRUE(isFree(mutex));
+}
+
+TEST(Mutex, IgnoresAnUnlockByAThreadThatHasItNot) {
+    Mutex mutex;
+    mutex.lock(withoutLimit);
+    std::thread([&mutex] { mutex.unlock(); }).join();
+    EXPECT_FALSE(isFree(mutex));
+    mutex.unlock();
+    mutex.unlock();
+    EXPECT_TRUE(isFree(mutex));
+}
+
+TEST(Mutex, LetsOneThreadIntoTheSectionAtATime) {
+    Mutex mutex;
+    int count = 0;
+    const auto work = [&mutex, &count] {
+        for (int round = 0; round < 2000; ++round) {
+            mutex.lock(withoutLimit);
+            count = count + 1;
+            mutex.unlock();
+        }
+    };
+    std::thread one(work);
+    std::thread other(work);
+    one.join();
+    other.join();
+    EXPECT_EQ(count, 4000);
+}

@@ -1,0 +1,34 @@
+#pragma once
+
+#include "model/Value.h"
+
+#include <string>
+#include <utility>
+
+namespace agent_test {
+
+/** A plain value of a CIM type, such as plain(CMPI_uint32, std::uint32_t{7}). */
+template <typename Element>
+cimhost::Value plain(CMPIType type, Element element) {
+    return {type, false, false, {cimhost::Scalar(std::move(element))}};
+}
+
+inline cimhost::Value text(std::string value) {
+    return plain(CMPI_string, std::move(value));
+}
+
+inline cimhost::Value reference(cimhost::ObjectPath path) {
+    return plain(CMPI_ref, std::make_shared<const cimhost::ObjectPath>(std::move(path)));
+}
+
+inline cimhost::Value nullOf(CMPIType type) {
+    return {type, false, true, {}};
+}
+
+/** The text of a value that is one; otherwise a text that no test expects. */
+inline std::string textIn(const cimhost::Value& value) {
+    const std::string* found = value.elements.empty() ? nullptr : std::get_if<std::string>(&value.elements.front());
+    return found != nullptr ? *found : "(no text)";
+}
+
+}  // namespace agent_test

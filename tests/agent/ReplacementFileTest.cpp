@@ -1,0 +1,82 @@
+#include "framework/ReplacementFile.h"
+
+#include "Exceptions.h"
+#include "agent/TemporaryDirectory.h"
+
+#include <gtest/gtest.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <filesystem>
+
+using agent_test::TemporaryDirectory;
+using KO::replaceFile;
+
+namespace {
+
+unsigned int modeOf(const std::string& path) {
+    struct stat status {};
+    EXPECT_EQ(::stat(path.c_str(), &status), 0);
+    return status.st_mode & 07777U;
+}
+
+std::size_t entriesOf(const TemporaryDirectory& directory) {
+    const std::filesystem::directory_iterator entries(directory.path());
+    return static_cast<std::size_t>(std::distance(begin(entries), end(entries)));
+}
+
+}  // namespace
+
+TEST(ReplacementFile, TakesThePlaceOfTheOldOneWithItsMode) {
+    const TemporaryDirectory directory;
+    const std::string path = directory.write("file", "old");
+    ASSERT_EQ(::chmod(path.c_str(), 0604), 0);
+    replaceFile(path, "new");
+    EXPECT_EQ(directory.read("file"), "new");
+    EXPECT_EQ(modeOf(path), 0604U);
+    EXPECT_EQ(entriesOf(directory), 1U) << "nothing is left behind";
+}
+
+TEST(ReplacementFile, IsNotForEverybodyWhenItIsNew) {
+    const TemporaryDirectory directory;
+    replaceFile(directory.file("file"), "new");
+    EXPECT_EQ(directory.read("file"), "new");
+    EXPECT_EQ(modeOf(directory.file("file")), 0640U);
+}
+
+TEST(ReplacementFile, LeavesAReaderOfTheOldContentUndisturbed) {
+    const TemporaryDirectory directory;
+    std::ifstream reader(directory.write("file", "old"));
+    replaceFile(directory.file("file"), "new");
+    std::string line;
+    std::getline(reader, line);
+    EXPECT_EQ(line, "old");
+}
+
+TEST(ReplacementFile, ReplacesWhatASymbolicLinkLeadsTo) {
+    const TemporaryDirectory directory;
+    directory.write("file", "old");
+    std::filesystem::create_symlink("file", directory.file("link"));
+    replaceFile(directory.file("link"), "new");
+    EXPECT_TRUE(std::filesystem::is_symlink(directory.file("link")));
+    EXPECT_EQ(directory.read("file"), "new");
+}
+
+TEST(ReplacementFile, SaysWhyItCannotBeMade) {
+    const TemporaryDirectory directory;
+    try {
+        replaceFile(directory.file("none/file"), "new");
+        FAIL() << "no exception";
+    } catch (const KO::FrameworkException& failure) {
+        EXPECT_EQ(failure.what(), "Cannot write " + directory.file("none/file") + ": No such file or directory");
+    }
+}
+
+TEST(ReplacementFile, LeavesTheOldOneWhenItFails) {
+    const TemporaryDirectory directory;
+    std::filesystem::create_directory(directory.file("target"));
+    directory.write("target/inside", "old");
+    EXPECT_THROW(replaceFile(directory.file("target"), "new"), KO::FrameworkException);
+    EXPECT_EQ(directory.read("target/inside"), "old");
+    EXPECT_EQ(entriesOf(directory), 1U) << "the temporary file is gone";
+}

@@ -1,0 +1,42 @@
+#include "configuration/Utf8.h"
+
+#include <gtest/gtest.h>
+
+using Agent::firstCharacter;
+using Agent::Utf8Character;
+
+namespace {
+
+struct Case {
+    const char* description;
+    std::string_view text;
+    std::uint32_t codePoint;
+    std::size_t length;
+    bool valid;
+};
+
+class Utf8Decoding : public testing::TestWithParam<Case> {};
+
+}  // namespace
+
+TEST_P(Utf8Decoding, GivesTheFirstCharacter) {
+    const Case& expected = GetParam();
+    const Utf8Character character = firstCharacter(expected.text);
+    EXPECT_EQ(character.codePoint, expected.codePoint) << expected.description;
+    EXPECT_EQ(character.length, expected.length) << expected.description;
+    EXPECT_EQ(character.valid, expected.valid) << expected.description;
+}
+
+INSTANTIATE_TEST_SUITE_P(
+    Utf8, Utf8Decoding,
+    testing::Values(Case{"ASCII", "a", 'a', 1, true}, Case{"NUL", std::string_view("\0b", 2), 0, 1, true},
+                    Case{"two bytes", "\xC3\xA9!", 0xE9, 2, true}, Case{"three bytes", "\xE2\x82\xAC", 0x20AC, 3, true},
+                    Case{"four bytes", "\xF0\x9F\x98\x80", 0x1F600, 4, true},
+                    Case{"the last code point", "\xF4\x8F\xBF\xBF", 0x10FFFF, 4, true},
+                    Case{"beyond the last", "\xF4\x90\x80\x80", 0xF4, 1, false},
+                    Case{"a continuation alone", "\x80", 0x80, 1, false},
+                    Case{"overlong slash", "\xC0\xAF", 0xC0, 1, false},
+                    Case{"overlong three bytes", "\xE0\x80\xAF", 0xE0, 1, false},
+                    Case{"a surrogate", "\xED\xA0\x80", 0xED, 1, false}, Case{"cut off", "\xE2\x82", 0xE2, 1, false},
+                    Case{"broken off", "\xE2\x82x", 0xE2, 1, false},
+                    Case{"never a first byte", "\xFF", 0xFF, 1, false}));
