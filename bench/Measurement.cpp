@@ -1,0 +1,132 @@
+#include "Cases.h"
+
+#include <benchmark/benchmark.h>
+
+#include <exception>
+#include <fstream>
+#include <iterator>
+#include <stdexcept>
+
+namespace bench {
+
+namespace {
+
+std::string fileText(const std::filesystem::path& file) {
+    std::ifstream stream(file, std::ios::binary);
+    if (!stream) {
+        throw std::runtime_error("there is no " + file.string());
+    }
+    return {std::istreambuf_iterator<char>(stream), {}};
+}
+
+/** Performs a request once an iteration. @param interfaces gives what answers it @return the last outcome */
+template <class GiveInterfaces>
+Outcome measure(benchmark::State& state, Workbench& bench, const Request& request, GiveInterfaces interfaces) {
+    Outcome outcome;
+    for (auto _ : state) {
+        outcome = {};
+        outcome = perform(bench.broker(), request, interfaces());
+        state.SetIterationTime(outcome.seconds);
+        requireAnswered(request, outcome);
+    }
+    return outcome;
+}
+
+void measureFloor(benchmark::State& state, Workbench& bench, const Case& one) {
+    std::unique_ptr<Floor> floor;
+    measure(state, bench, one.request, [&] {
+        if (floor == nullptr || !one.changedFile.empty()) {
+            floor = one.floor(bench, bench.broker().handle());
+        }
+        return floor->interfaces();
+    });
+}
+
+void measureProvider(benchmark::State& state, Workbench& bench, const Case& one) {
+    const Outcome outcome = measure(state, bench, one.request, [&] { return one.provider(bench); });
+    const std::unique_ptr<Floor> floor = one.floor(bench, bench.broker().handle());
+    requireSame(outcome.events, perform(bench.broker(), one.request, floor->interfaces()).events);
+    if (!one.changedFile.empty() &&
+        fileText(bench.agent().data() / one.changedFile) != fileText(bench.agent().floorData() / one.changedFile)) {
+        throw std::runtime_error("the record file is not what it should be after the change");
+    }
+}
+
+/** Registers a benchmark that measures its own time; what it throws makes it fail. */
+template <class Body>
+void registerBenchmark(const std::string& name, bool& failed, Body body) {
+    const auto guarded = [&failed, body](benchmark::State& state) {
+        try {
+            body(state);
+        } catch (const std::exception& failure) {
+            failed = true;
+            state.SkipWithError(failure.what());
+        }
+    };
+    benchmark::RegisterBenchmark(name.c_str(), guarded)->UseManualTime()->Unit(benchmark::kMicrosecond);
+}
+
+template <class Row>
+void measureLoading(benchmark::State& state, Workbench& bench, std::size_t size) {
+    bench.unload();
+    writeRows(bench.agent().data() / Row::fileName, makeRows<Row>(size));
+    for (auto _ : state) {
+        const double begin = processorSeconds();
+        { const SharedLibrary library(ProviderLibrary::file()); }
+        state.SetIterationTime(processorSeconds() - begin);
+        if (SharedLibrary::isLoaded(ProviderLibrary::file())) {
+            throw std::runtime_error("the provider library stays in the process");
+        }
+    }
+    const Request request = enumInstanceNames(Row::className, size);
+    requireAnswered(request, perform(bench.broker(), request, bench.loaded<Row>(size)));
+}
+
+template <class Row>
+void measureReading(benchmark::State& state, const Workbench& bench, std::size_t size) {
+    const std::filesystem::path file = bench.agent().floorData() / Row::fileName;
+    writeRows(file, makeRows<Row>(size));
+    for (auto _ : state) {
+        const double begin = processorSeconds();
+        std::vector<Row> rows = readRows<Row>(file);
+        const bool right = rows.size() == size && rows.back().instanceId == instanceIdOf(size - 1, size);
+        rows = {};
+        state.SetIterationTime(processorSeconds() - begin);
+        if (!right) {
+            throw std::runtime_error("the record file was not read");
+        }
+    }
+}
+
+template <class Row>
+void registerLoadingOf(Workbench& workbench, bool& failed) {
+    const std::string name = std::string("Load/") + Row::className;
+    for (const std::size_t size : readSizes) {
+        registerBenchmark(name + "/provider/" + std::to_string(size), failed,
+                          [&workbench, size](benchmark::State& state) { measureLoading<Row>(state, workbench, size); });
+        registerBenchmark(name + "/floor/" + std::to_string(size), failed,
+                          [&workbench, size](benchmark::State& state) { measureReading<Row>(state, workbench, size); });
+    }
+}
+
+}  // namespace
+
+void registerCase(const Case& one, Workbench& workbench, bool& failed) {
+    const std::string name = one.operation + '/' + one.className;
+    const auto registerSide = [&](const char* side, auto measureSide) {
+        registerBenchmark(name + side + std::to_string(one.size), failed,
+                          [&workbench, one, measureSide](benchmark::State& state) {
+                              workbench.computers().count = one.computers;
+                              measureSide(state, workbench, one);
+                          });
+    };
+    registerSide("/provider/", &measureProvider);
+    registerSide("/floor/", &measureFloor);
+}
+
+void registerLoading(Workbench& workbench, bool& failed) {
+    registerLoadingOf<LeaseRow>(workbench, failed);
+    registerLoadingOf<WarrantyRow>(workbench, failed);
+}
+
+}  // namespace bench

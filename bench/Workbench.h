@@ -1,0 +1,67 @@
+#pragma once
+
+#include "AgentDirectory.h"
+#include "ProviderLibrary.h"
+#include "RecordFile.h"
+#include "Rows.h"
+#include "broker/Broker.h"
+#include "broker/UpCalls.h"
+
+#include <cstddef>
+#include <optional>
+#include <string>
+#include <vector>
+
+namespace bench {
+
+/** Answers what the provider asks the object manager for: the instances of the managed computers. */
+class ComputerSystems : public cimhost::UpCalls {
+public:
+    /** How many computers there are; the first is the one that the agent manages. */
+    std::size_t count = 1;
+
+    cimhost::Answer<std::vector<cimhost::Instance>> enumerateInstances(const cimhost::ContextEntries& context,
+                                                                       const cimhost::ObjectPath& path,
+                                                                       const cimhost::PropertyList& list) override;
+};
+
+/** Where all benchmarks are run: an agent, the object manager's broker and, loaded on demand, the provider. */
+class Workbench {
+public:
+    cimhost::Broker& broker() { return objectManager; }
+    ComputerSystems& computers() { return upCalls; }
+    const AgentDirectory& agent() const { return directory; }
+
+    /** The provider, freshly loaded with these records and none of the other class. */
+    template <class Row>
+    Interfaces load(const std::vector<Row>& rows) {
+        unload();
+        writeRows(directory.data() / Row::fileName, rows);
+        provider.emplace(objectManager.handle());
+        return provider->interfaces();
+    }
+
+    /** The provider with a table of that many records: still loaded since the last such call, or anew. */
+    template <class Row>
+    Interfaces loaded(std::size_t size) {
+        const std::string wanted = Row::fileName + std::to_string(size);
+        if (!provider || content != wanted) {
+            load(makeRows<Row>(size));
+            content = wanted;
+        }
+        return provider->interfaces();
+    }
+
+    /** Takes the provider out of the process and its records away. */
+    void unload();
+
+private:
+    AgentDirectory directory{};
+    AgentLibraries agentLibraries{};
+    ComputerSystems upCalls{};
+    cimhost::Broker objectManager{{{}, &upCalls, {}, nullptr}};
+    std::optional<ProviderLibrary> provider{};
+    std::string content{};  ///< what loaded() has loaded; empty when a request may have changed it
+};
+
+}  // namespace bench
