@@ -48,10 +48,11 @@ CMPIInstance* newInstance(const CMPIBroker* broker, const CMPIObjectPath* path, 
 
 CMPIObjectPath* newObjectPath(const CMPIBroker* broker, const char* nameSpace, const char* className, CMPIStatus* rc) {
     return guarded<CMPIObjectPath*>(rc, nullptr, [&] {
+        Arena& arena = arenaOf(broker);
         ObjectPath path;
         path.nameSpace = nameSpace == nullptr ? "" : nameSpace;
         path.className = argument(className);
-        return arenaOf(broker).make<CMPIObjectPath>(std::move(path));
+        return arena.make<CMPIObjectPath>(std::move(path));
     });
 }
 

@@ -9,7 +9,10 @@ namespace {
 
 template <std::string ObjectPath::*part>
 CMPIStatus setPart(CMPIObjectPath* path, const char* text) {
-    return guarded([&] { content(path).*part = argument(text); });
+    return guarded([&] {
+        std::string& target = content(path).*part;
+        target = argument(text);
+    });
 }
 
 template <std::string ObjectPath::*part>

@@ -1,0 +1,154 @@
+#include <stdexcept>
+
+#include "BrokerFixture.h"
+
+namespace {
+
+using cimhost::Answer;
+using cimhost::ContextEntries;
+using cimhost::Instance;
+using cimhost::ObjectPath;
+using cimhost::PropertyList;
+using cimhost::Status;
+using cimhost::Value;
+
+/** Answers some operations with what it was asked. */
+class Echo : public cimhost::UpCalls {
+public:
+    Answer<std::vector<Instance>> enumerateInstances(const ContextEntries& context, const ObjectPath& path,
+                                                     const PropertyList& properties) override {
+        if (path.className == "Throwing") {
+            throw std::runtime_error("broken");
+        }
+        if (path.className == "Failing") {
+            return {{CMPI_RC_ERR_ACCESS_DENIED, "not you"}, {}};
+        }
+        lastContext = context;
+        lastProperties = properties;
+        return {{}, {{path, {}}, {{{}, path.nameSpace, "Second", {}}, {}}}};
+    }
+
+    Answer<std::vector<ObjectPath>> associatorNames(const ContextEntries&, const ObjectPath& path,
+                                                    const cimhost::AssociationFilter& filter) override {
+        lastFilter = filter;
+        return {{}, {path}};
+    }
+
+    Answer<Instance> getInstance(const ContextEntries&, const ObjectPath& path, const PropertyList&) override {
+        return {{}, {path, {testsupport::named("P", testsupport::uint32(1))}}};
+    }
+
+    Answer<ObjectPath> createInstance(const ContextEntries&, const ObjectPath&, const Instance& instance) override {
+        return {{}, instance.path};
+    }
+
+    Status deleteInstance(const ContextEntries&, const ObjectPath&) override { return {}; }
+
+    Answer<Value> invokeMethod(const ContextEntries&, const ObjectPath&, const std::string& method,
+                               const std::vector<cimhost::NamedValue>& input,
+                               std::vector<cimhost::NamedValue>& output) override {
+        output = input;
+        return {{}, testsupport::text(method)};
+    }
+
+    ContextEntries lastContext;
+    PropertyList lastProperties;
+    cimhost::AssociationFilter lastFilter;
+};
+
+class UpCallTest : public BrokerTest {
+protected:
+    static cimhost::BrokerOptions options(Echo& echo) {
+        cimhost::BrokerOptions made;
+        made.upCalls = &echo;
+        return made;
+    }
+
+    UpCallTest() : calling(options(echo)), request(calling) {}
+
+    const CMPIBroker* caller() const { return calling.handle(); }
+    const CMPIBrokerFT& up() const { return *caller()->bft; }
+
+    Echo echo;
+    cimhost::Broker calling;
+    cimhost::RequestScope request;
+    const CMPIContext* context = request.context({testsupport::named("Mine", testsupport::text("kept"))});
+};
+
+TEST_F(UpCallTest, AnEnumerationIsWalkedThroughOnce) {
+    const CMPIEnumeration* found = up().enumerateInstances(caller(), context, newPath("First"), nullptr, &status);
+    ASSERT_EQ(status.rc, CMPI_RC_OK);
+    EXPECT_EQ(found->ft->hasNext(found, &status), 1);
+    const CMPIData first = found->ft->getNext(found, &status);
+    ASSERT_EQ(first.type, CMPI_instance);
+    const CMPIObjectPath* path = first.value.inst->ft->getObjectPath(first.value.inst, nullptr);
+    EXPECT_EQ(characters(path->ft->getClassName(path, nullptr)), "First");
+    found->ft->getNext(found, &status);
+    EXPECT_EQ(found->ft->hasNext(found, &status), 0);
+    EXPECT_EQ(status.rc, CMPI_RC_OK);
+    EXPECT_EQ(found->ft->getNext(found, &status).state, CMPI_badValue);
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_FAILED);
+    const CMPIArray* all = found->ft->toArray(found, nullptr);
+    EXPECT_EQ(all->ft->getSize(all, nullptr), 2U);
+}
+
+TEST_F(UpCallTest, ContextAndPropertyListGoAlong) {
+    const char* list[] = {"A", "B", nullptr};
+    up().enumerateInstances(caller(), context, newPath(), list, &status);
+    EXPECT_EQ(testsupport::textOf(echo.lastContext, "Mine"), "kept");
+    EXPECT_EQ(echo.lastProperties, (std::vector<std::string>{"A", "B"}));
+    up().enumerateInstances(caller(), nullptr, newPath(), nullptr, &status);
+    EXPECT_EQ(status.rc, CMPI_RC_OK);
+    EXPECT_EQ(echo.lastProperties, std::nullopt);
+}
+
+TEST_F(UpCallTest, AFilterKeepsNullAndEmptyApart) {
+    up().associatorNames(caller(), context, newPath(), "Assoc", "", nullptr, "Role", &status);
+    EXPECT_EQ(status.rc, CMPI_RC_OK);
+    EXPECT_EQ(echo.lastFilter.associationClass, "Assoc");
+    EXPECT_EQ(echo.lastFilter.resultClass, "");
+    EXPECT_EQ(echo.lastFilter.role, std::nullopt);
+    EXPECT_EQ(echo.lastFilter.resultRole, "Role");
+}
+
+TEST_F(UpCallTest, SingleObjectsAreObjects) {
+    const CMPIInstance* instance = up().getInstance(caller(), context, newPath(), nullptr, &status);
+    ASSERT_EQ(status.rc, CMPI_RC_OK);
+    EXPECT_EQ(instance->ft->getProperty(instance, "P", nullptr).value.uint32, 1U);
+    const CMPIObjectPath* path = up().createInstance(caller(), context, newPath(), newInstance("New"), &status);
+    EXPECT_EQ(characters(path->ft->getClassName(path, nullptr)), "New");
+    EXPECT_EQ(up().deleteInstance(caller(), context, path).rc, CMPI_RC_OK);
+}
+
+TEST_F(UpCallTest, MethodsHaveOutput) {
+    CMPIArgs* input = make().newArgs(handle(), nullptr);
+    input->ft->addArg(input, "A", charsValue("x"), CMPI_chars);
+    CMPIArgs* output = make().newArgs(handle(), nullptr);
+    const CMPIData answer = up().invokeMethod(caller(), context, newPath(), "M", input, output, &status);
+    EXPECT_EQ(characters(answer.value.string), "M");
+    EXPECT_EQ(output->ft->getArgCount(output, nullptr), 1U);
+}
+
+TEST_F(UpCallTest, FailuresComeWithTheirText) {
+    EXPECT_EQ(up().enumerateInstances(caller(), context, newPath("Failing"), nullptr, &status), nullptr);
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_ACCESS_DENIED);
+    EXPECT_EQ(characters(status.msg), "not you");
+    EXPECT_EQ(up().enumerateInstances(caller(), context, newPath("Throwing"), nullptr, &status), nullptr);
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_FAILED);
+    EXPECT_EQ(characters(status.msg), "broken");
+}
+
+TEST_F(UpCallTest, WhatNobodyAnswersIsNotSupported) {
+    EXPECT_EQ(up().modifyInstance(caller(), context, newPath(), newInstance(), nullptr).rc, CMPI_RC_ERR_NOT_SUPPORTED);
+    EXPECT_EQ(up().execQuery(caller(), context, newPath(), "q", "WQL", &status), nullptr);
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_NOT_SUPPORTED);
+    EXPECT_EQ(up().deliverIndication(caller(), context, "root", newInstance()).rc, CMPI_RC_ERR_NOT_SUPPORTED);
+    EXPECT_EQ(handle()->bft->enumerateInstanceNames(handle(), context, newPath(), &status), nullptr);
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_NOT_SUPPORTED);
+    EXPECT_EQ(up().setProperty(caller(), context, newPath(), "P", charsValue("x"), CMPI_chars).rc,
+              CMPI_RC_ERR_NOT_SUPPORTED);
+    up().getProperty(caller(), context, newPath(), "P", &status);
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_NOT_SUPPORTED);
+}
+
+}  // namespace
