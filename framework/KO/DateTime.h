@@ -18,7 +18,7 @@ public:
     DateTime();
 
     /**
-     * A date from the clock.
+     * A date from the clock. A moment outside of the years 0 to 9999 is no date.
      * @param seconds seconds since 1970-01-01 00:00 UTC, as time() gives them
      * @param kind    the form to be shown: 3 is local time with its offset, anything else UTC
      */

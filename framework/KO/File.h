@@ -41,15 +41,19 @@ public:
     File& operator=(const File&) = delete;
 
     /**
-     * Opens the file in a FileMode. Mode 3 creates it, empty, if it is absent.
-     * @throws FrameworkException when it cannot be opened, saying why
+     * Opens the file in a FileMode. Mode 3 creates it, empty, if it is absent. A file that is open
+     * already is closed first.
+     * @throws FrameworkException when it cannot be opened or is no ordinary file, saying why
      */
     void open(unsigned long mode);
 
     /** Closes the file; without an open file nothing happens. */
     void close();
 
-    /** Whether something of that name exists. False also when that cannot be found out. */
+    /**
+     * Whether something of that name exists; a symbolic link exists if what it leads to does. False
+     * also when that cannot be found out.
+     */
     static bool exists(const std::wstring& path);
 
 private:

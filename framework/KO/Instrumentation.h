@@ -12,8 +12,8 @@ namespace KO {
  * A cursor over the agent's instrumentation tree: the nodes that stand for the managed system and
  * its parts.
  *
- * A new cursor stands on no node. Each selection replaces the one before it. The tree is read when
- * the cursor is made and does not change under it. A cursor belongs to one thread.
+ * A new cursor stands on no node. Each selection replaces the one before it. The tree does not change
+ * under a cursor. A cursor belongs to one thread.
  */
 class KO_EXPORT Instrumentation {
 public:

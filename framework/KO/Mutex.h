@@ -17,11 +17,11 @@ public:
     /**
      * Waits for the lock and takes it.
      * @param timeout milliseconds to wait at most; 0xFFFFFFFF waits without limit
-     * @throws FrameworkException when the time is over
+     * @throws FrameworkException when the time is over, or when this thread has the lock already
      */
     void lock(unsigned long timeout);
 
-    /** Gives the lock back. Only the thread that holds it may. */
+    /** Gives the lock back. Only the thread that holds it may; for any other nothing happens. */
     void unlock();
 
 private:

@@ -28,14 +28,15 @@ public:
 
     /**
      * Reads the whole file. FILE_MODE_READ wants it to exist; FILE_MODE_WRITE creates it, empty, if
-     * it is absent.
+     * it is absent. What was written since an earlier open() without close() is dropped.
      * @throws FrameworkException when it cannot be opened or read
      */
     void open(unsigned long mode);
 
     /**
      * Commits what was written and closes the file; without an open file nothing happens.
-     * @throws FrameworkException when the new content cannot be stored; the old one then stands
+     * @throws FrameworkException when the new content cannot be stored; the old one then stands, and
+     *         the file is closed all the same
      */
     void close();
 

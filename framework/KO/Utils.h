@@ -40,7 +40,10 @@ public:
      */
     static std::string convertCIMDateTime(DateTime value);
 
-    /** The date that a CIM datetime text tells; no date when it is no valid one. */
+    /**
+     * The date that a CIM datetime text tells; no date when it is no valid one. An interval is no date.
+     * convertCIMDateTime() gives back exactly the text that a date was made from.
+     */
     static DateTime convertStringToDateTime(std::string text);
 };
 

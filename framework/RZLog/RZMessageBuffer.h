@@ -10,6 +10,9 @@ namespace RZLog {
 
 /**
  * An output buffer in which one message after another is put together. It belongs to one thread.
+ *
+ * Its stream starts each message like a new one, with the classic locale: formatting flags, errors and
+ * exception masks do not reach the next message. Making a buffer is cheap; make one where it is needed.
  */
 class KO_EXPORT RZMessageBuffer {
 public:

@@ -7,7 +7,10 @@
 #include "KO/Strings.h"
 #include "RZLog/RZLogger.h"
 
+#include <sys/resource.h>
+
 #include <cerrno>
+#include <csignal>
 #include <cstdlib>
 #include <cstring>
 #include <iostream>
@@ -60,6 +63,20 @@ void show() {
     }
 }
 
+/** probe limited: logs while no file may grow beyond a few bytes, and then while it may again. */
+void logToAFullDisk() {
+    std::signal(SIGXFSZ, SIG_IGN);
+    rlimit limit{};
+    ::getrlimit(RLIMIT_FSIZE, &limit);
+    const rlim_t before = limit.rlim_cur;
+    limit.rlim_cur = 20;
+    ::setrlimit(RLIMIT_FSIZE, &limit);
+    log(3000, "Ostrel.Test", "lost");
+    log(3000, "Ostrel.Test", "lost as well");
+    limit.rlim_cur = before;
+    ::setrlimit(RLIMIT_FSIZE, &limit);
+}
+
 /** Logs when the process's static objects go, those of the libraries included. */
 struct LogAtExit {
     bool enabled = false;
@@ -81,6 +98,8 @@ int main(int count, char** arguments) {
         logMany(std::stoi(words[1]), std::stoi(words[2]));
     } else if (words.size() == 1 && words[0] == "show") {
         show();
+    } else if (words.size() == 1 && words[0] == "limited") {
+        logToAFullDisk();
     } else if (words.size() == 1 && words[0] == "crash") {
         log(3000, "Ostrel.Test", "the last words");
         std::_Exit(0);

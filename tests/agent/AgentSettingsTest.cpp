@@ -85,7 +85,7 @@ discover = false
 [[instrumentation.node]]
 type = 40
 path = "/rack 1/host_2"
-properties = { "108" = "host2", "39" = "Model X - Tower", "36" = "" }
+properties = { 108 = "host2", "39" = "Model X - Tower", "36" = "" }
 [[instrumentation.node]]
 type = 65535
 path = "x"

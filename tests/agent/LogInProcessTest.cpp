@@ -86,7 +86,13 @@ TEST_F(LogInProcess, SwallowsRecordsForAFileThatCannotBeOpened) {
 }
 
 TEST_F(LogInProcess, SwallowsRecordsThatCannotBeWritten) {
-    run("destination = '/dev/full'\n", {"log", "3000", "Ostrel.Test", "to a full disk"});
+    run(toFile(), {"limited"});
+    EXPECT_LE(directory.read("agent.log").size(), 20U);
+}
+
+TEST_F(LogInProcess, WritesToNoDevice) {
+    run("destination = '/dev/full'\n", {"log", "3000", "Ostrel.Test", "to a device"});
+    run("destination = '/dev/stderr'\n", {"log", "3000", "Ostrel.Test", "to a standard stream"});
 }
 
 TEST_F(LogInProcess, DoesNotWaitForThePartnerOfAPipe) {

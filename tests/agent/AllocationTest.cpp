@@ -1,0 +1,67 @@
+#include "RZLog/RZLogger.h"
+#include "RZLog/RZMessageBuffer.h"
+
+#include <gtest/gtest.h>
+
+#include <cstdlib>
+#include <new>
+
+namespace {
+
+thread_local long allocations = 0;
+
+}  // namespace
+
+void* operator new(std::size_t size) {
+    ++allocations;
+    if (void* memory = std::malloc(size)) {
+        return memory;
+    }
+    throw std::bad_alloc();
+}
+
+void operator delete(void* memory) noexcept {
+    std::free(memory);
+}
+void operator delete(void* memory, std::size_t) noexcept {
+    std::free(memory);
+}
+
+namespace {
+
+class Allocation : public testing::Test {
+protected:
+    void SetUp() override { ::setenv("OSTREL_CONFIG", "/no/such/file", 1); }
+};
+
+}  // namespace
+
+TEST_F(Allocation, IsCountedInTheLibraryToo) {
+    const long before = allocations;
+    { const RZLog::RZMessageBuffer buffer; }
+    EXPECT_GT(allocations, before) << "the first buffer must be made";
+}
+
+TEST_F(Allocation, IsNotNeededForARecordThatIsNotAdmitted) {
+    const std::string logger = "a name that does not fit into a string object";
+    const std::string text = "a text that does not fit into a string object either";
+    const auto log = [&] {
+        RZLog::RZLogger::logLevelMessage(__func__, __FILE__, __LINE__, logger, 4000, nullptr, 0, 0, text);
+        RZLog::RZLogger::traceLevelMessage(__func__, __FILE__, __LINE__, logger, 6000, nullptr, 0, 0, text);
+    };
+    log();  // reads the configuration
+    const long before = allocations;
+    log();
+    EXPECT_EQ(allocations, before);
+}
+
+TEST_F(Allocation, IsNotNeededForABufferAfterOthers) {
+    const auto useBuffer = [] {
+        RZLog::RZMessageBuffer buffer;
+        buffer << "a text that does not fit into a string object";
+    };
+    useBuffer();
+    const long before = allocations;
+    useBuffer();
+    EXPECT_EQ(allocations, before);
+}
