@@ -1,0 +1,176 @@
+#include "cli/Arguments.h"
+
+#include <CLI/CLI.hpp>
+#include <map>
+#include <sstream>
+
+#include "Installation.h"
+#include "cli/ExitStatus.h"
+
+namespace cimhost {
+namespace {
+
+constexpr auto introduction =
+    "Runs requests on CMPI providers without an installed object manager.\n"
+    "Providers come from registration files in SFCB's form, classes from MOF files.";
+
+constexpr auto closing =
+    R"(Object paths are WBEM URIs: [namespace:]Class[.Key=value,...]. String keys stand in quotation marks, which
+a shell keeps only inside of quotes:
+
+  cimhost ei Some_Class
+  cimhost gi 'Some_Class.InstanceID="1"'
+  cimhost mi 'Some_Class.InstanceID="1"' ElementName='a name' Size=5 Tags='{"a", "b"}' --null Owner
+  cimhost ai 'root/cimv2:Some_System.Name="host"' --assoc-class Some_Association
+  cimhost --format json ein Some_Class
+  cimhost --schema my.mof --registration my.reg --library-path build/lib ei My_Class
+
+Environment: CIMHOST_SCHEMA, CIMHOST_REGISTRATION and CIMHOST_LIBRARY_PATH hold files or directories, separated
+by colons, for what the options do not name.
+
+Exit status: 0 success, 1 the request was answered with an error, 2 wrong usage, 3 a library, registration or
+schema cannot be loaded, 4 the output cannot be written.)";
+
+enum class Target { none, className, objectPath };
+
+struct Command {
+    std::optional<Operation> operation;
+    const char* name;
+    const char* shortName;  ///< null: none
+    const char* description;
+    Target target;
+    bool assigns;     ///< takes NAME=VALUE
+    bool associates;  ///< takes --assoc-class, --result-role
+    bool refers;      ///< takes --result-class, --role
+    bool lists;       ///< takes --property
+};
+
+constexpr Command commands[] = {
+    {Operation::enumerateInstances, "enumerate-instances", "ei", "List the instances of a class", Target::className,
+     false, false, false, true},
+    {Operation::enumerateInstanceNames, "enumerate-instance-names", "ein", "List the paths of a class's instances",
+     Target::className, false, false, false, false},
+    {Operation::getInstance, "get-instance", "gi", "Show an instance", Target::objectPath, false, false, false, true},
+    {Operation::createInstance, "create-instance", "ci", "Create an instance and show its path", Target::objectPath,
+     true, false, false, false},
+    {Operation::modifyInstance, "modify-instance", "mi", "Set properties of an instance", Target::objectPath, true,
+     false, false, false},
+    {Operation::deleteInstance, "delete-instance", "di", "Delete an instance", Target::objectPath, false, false, false,
+     false},
+    {Operation::associators, "associators", "ai", "List the instances associated with an instance", Target::objectPath,
+     false, true, true, true},
+    {Operation::associatorNames, "associator-names", "ain", "List the paths of the instances associated with one",
+     Target::objectPath, false, true, true, false},
+    {Operation::references, "references", "ri", "List the associations that refer to an instance", Target::objectPath,
+     false, false, true, true},
+    {Operation::referenceNames, "reference-names", "rin", "List the paths of the associations that refer to one",
+     Target::objectPath, false, false, true, false},
+    {std::nullopt, "classes", nullptr, "List the classes and the providers that serve them", Target::none, false, false,
+     false, false},
+};
+
+Format formatNamed(const std::string& word) {
+    const std::map<std::string, Format> formats = {
+        {"text", Format::text}, {"json", Format::json}, {"mof", Format::mof}};
+    const auto found = formats.find(word);
+    if (found == formats.end()) {
+        throw CLI::ValidationError("--format", word + " is not one of text, json and mof");
+    }
+    return found->second;
+}
+
+void addCommonOptions(CLI::App& app, Arguments& arguments) {
+    app.add_option("--schema", arguments.schemas, "MOF file with classes, or a directory of them (repeatable)")
+        ->type_name("FILE")
+        ->allow_extra_args(false);
+    app.add_option("--registration", arguments.registrations,
+                   "Provider registration file, or a directory of them (repeatable)")
+        ->type_name("FILE")
+        ->allow_extra_args(false);
+    app.add_option("--library-path", arguments.libraryPaths, "Directory with provider libraries (repeatable)")
+        ->type_name("DIR")
+        ->allow_extra_args(false);
+    app.add_option("--namespace", arguments.nameSpace, "Namespace of paths that name none")
+        ->type_name("NAME")
+        ->capture_default_str();
+    const auto setFormat = [&arguments](const std::string& word) { arguments.format = formatNamed(word); };
+    app.add_option_function<std::string>("--format", setFormat, "Form of the output: text (default), json or mof")
+        ->type_name("FORM");
+    app.add_flag("--raw", arguments.raw,
+                 "Show exactly what the provider did: its status, each object it returned, its calls of returnDone");
+}
+
+void addCommand(CLI::App& app, const Command& command, Arguments& arguments) {
+    CLI::App* sub = app.add_subcommand(command.name, command.description);
+    sub->fallthrough();
+    sub->footer("See cimhost --help for options of all commands and for examples.");
+    if (command.shortName != nullptr) {
+        sub->alias(command.shortName);
+    }
+    if (command.target == Target::className) {
+        sub->add_option("CLASS", arguments.target, "Name of the class, [namespace:]Class")->required();
+    } else if (command.target == Target::objectPath) {
+        sub->add_option("PATH", arguments.target, "Object path, [namespace:]Class.Key=value,...")->required();
+    }
+    if (command.assigns) {
+        sub->add_option("NAME=VALUE", arguments.assignments, "Value for a property; NAME= is the empty string");
+        sub->add_option("--null", arguments.nulls, "Set this property to null (repeatable)")
+            ->type_name("NAME")
+            ->allow_extra_args(false);
+    }
+    if (command.associates) {
+        sub->add_option("--assoc-class", arguments.filter.associationClass, "Association to follow")
+            ->type_name("CLASS");
+        sub->add_option("--result-role", arguments.filter.resultRole, "Role of the other instance")->type_name("NAME");
+    }
+    if (command.refers) {
+        sub->add_option("--result-class", arguments.filter.resultClass, "Class of the results")->type_name("CLASS");
+        sub->add_option("--role", arguments.filter.role, "Role of the instance given")->type_name("NAME");
+    }
+    if (command.lists) {
+        sub->add_option("--property", arguments.properties, "Ask for this property only (repeatable)")
+            ->type_name("NAME")
+            ->allow_extra_args(false);
+    }
+    sub->callback([&arguments, &command] { arguments.operation = command.operation; });
+}
+
+/** Ends the program with what help, version or the mistake have to say. */
+void end(ParsedArguments& parsed, const CLI::App& app, const CLI::ParseError& error) {
+    std::ostringstream output;
+    std::ostringstream problem;
+    parsed.ended = true;
+    parsed.exitStatus = app.exit(error, output, problem) == 0 ? exitSuccess : exitUsage;
+    parsed.output = output.str();
+    if (parsed.exitStatus == exitSuccess) {
+        return;
+    }
+    const std::vector<std::string> unknown = app.remaining();
+    const bool noCommand = app.get_subcommands().empty() && !unknown.empty();
+    parsed.error = noCommand
+                       ? "there is no command or option " + unknown.front() + "\nRun with --help for those there are.\n"
+                       : problem.str();
+    parsed.error = "cimhost: " + parsed.error;
+}
+
+}  // namespace
+
+ParsedArguments parseArguments(int count, const char* const* values) {
+    ParsedArguments parsed;
+    CLI::App app(introduction, "cimhost");
+    app.footer(closing);
+    app.set_version_flag("--version", std::string("cimhost ") + installation::version);
+    app.require_subcommand(1);
+    addCommonOptions(app, parsed.arguments);
+    for (const Command& command : commands) {
+        addCommand(app, command, parsed.arguments);
+    }
+    try {
+        app.parse(count, values);
+    } catch (const CLI::ParseError& error) {
+        end(parsed, app, error);
+    }
+    return parsed;
+}
+
+}  // namespace cimhost

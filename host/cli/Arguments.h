@@ -1,0 +1,40 @@
+#pragma once
+
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "operations/Request.h"
+
+namespace cimhost {
+
+enum class Format { text, json, mof };
+
+/** The command line, as it was given. */
+struct Arguments {
+    std::optional<Operation> operation{};    ///< none: list the classes
+    std::string target{};                    ///< class name or object path; empty for classes
+    std::vector<std::string> assignments{};  ///< NAME=VALUE
+    std::vector<std::string> nulls{};        ///< properties to set to null
+    AssociationFilter filter{};
+    PropertyList properties{};
+    std::vector<std::string> schemas{};
+    std::vector<std::string> registrations{};
+    std::vector<std::string> libraryPaths{};
+    std::string nameSpace = "root/cimv2";
+    Format format = Format::text;
+    bool raw = false;
+};
+
+/** What became of reading a command line: arguments to act on, or an end with something to say. */
+struct ParsedArguments {
+    Arguments arguments{};
+    bool ended = false;    ///< help or version was asked for, or the command line is wrong
+    int exitStatus = 0;    ///< when ended
+    std::string output{};  ///< for standard output, when ended
+    std::string error{};   ///< for standard error, when ended
+};
+
+ParsedArguments parseArguments(int count, const char* const* values);
+
+}  // namespace cimhost

@@ -1,0 +1,148 @@
+#include "cli/Commands.h"
+
+#include "cli/ClassList.h"
+#include "cli/ClassShapes.h"
+#include "cli/ExitStatus.h"
+#include "cli/JsonOutput.h"
+#include "cli/Locations.h"
+#include "cli/RequestBuilder.h"
+#include "cli/TextOutput.h"
+#include "operations/Interpretation.h"
+#include "operations/ObjectManager.h"
+#include "schema/MofReader.h"
+#include "schema/MofWriter.h"
+
+namespace cimhost {
+namespace {
+
+using Answers = Answer<std::vector<RawAnswer>>;
+
+Schema readSchema(const Locations& locations) {
+    Schema schema;
+    MofReader reader(schema);
+    for (const auto& file : locations.schemas) {
+        reader.readFile(file);
+    }
+    return schema;
+}
+
+std::vector<ProviderRegistration> readRegistrations(const Locations& locations) {
+    std::vector<ProviderRegistration> registrations;
+    for (const auto& file : locations.registrations) {
+        const std::vector<ProviderRegistration> found = readRegistrationFile(file);
+        registrations.insert(registrations.end(), found.begin(), found.end());
+    }
+    return registrations;
+}
+
+std::string mofOf(const std::vector<Instance>& instances) {
+    std::string text;
+    for (const Instance& instance : instances) {
+        text += (text.empty() ? "" : "\n") + formatMof(instance);
+    }
+    return text;
+}
+
+Outcome showInstances(const Answers& answers, Operation operation, Format format) {
+    const Answer<std::vector<Instance>> found = resultsOf<Instance>(answers, operation);
+    if (!found.ok()) {
+        return {"", found.status};
+    }
+    switch (format) {
+        case Format::json:
+            return {json::format(found.value)};
+        case Format::mof:
+            return {mofOf(found.value)};
+        default:
+            return {text::format(found.value)};
+    }
+}
+
+Outcome showInstance(const Answers& answers, const ObjectPath& path, Format format) {
+    const Answer<Instance> found = oneInstance(answers, path);
+    if (!found.ok()) {
+        return {"", found.status};
+    }
+    switch (format) {
+        case Format::json:
+            return {json::format(found.value)};
+        case Format::mof:
+            return {formatMof(found.value)};
+        default:
+            return {text::format(std::vector<Instance>{found.value})};
+    }
+}
+
+Outcome showPaths(const Answers& answers, Operation operation, Format format) {
+    const Answer<std::vector<ObjectPath>> found = resultsOf<ObjectPath>(answers, operation);
+    if (!found.ok()) {
+        return {"", found.status};
+    }
+    return {format == Format::json ? json::format(found.value) : text::format(found.value)};
+}
+
+Outcome showCreated(const Answers& answers, Format format) {
+    const Answer<ObjectPath> created = createdPath(answers);
+    if (!created.ok()) {
+        return {"", created.status};
+    }
+    return {format == Format::json ? json::format(created.value)
+                                   : text::format(std::vector<ObjectPath>{created.value})};
+}
+
+Outcome show(const Answers& answers, const Request& request, Format format) {
+    switch (request.operation) {
+        case Operation::enumerateInstances:
+        case Operation::associators:
+        case Operation::references:
+            return showInstances(answers, request.operation, format);
+        case Operation::enumerateInstanceNames:
+        case Operation::associatorNames:
+        case Operation::referenceNames:
+            return showPaths(answers, request.operation, format);
+        case Operation::getInstance:
+            return showInstance(answers, request.path, format);
+        case Operation::createInstance:
+            return showCreated(answers, format);
+        default:
+            return {"", statusOf(answers, request.operation)};
+    }
+}
+
+Outcome showRaw(const Answers& answers, Operation operation, Format format) {
+    return {format == Format::json ? json::format(answers.value) : text::format(answers.value),
+            statusOf(answers, operation)};
+}
+
+Outcome runRequest(const Arguments& arguments, const Locations& locations, const Schema& schema) {
+    const ProviderRegistry registry(readRegistrations(locations));
+    try {
+        const Request request = buildRequest(arguments, schema);
+        ObjectManagerOptions options;
+        options.libraries.searchPath = locations.libraryPaths;
+        options.classShape = classShapes(schema);
+        ObjectManager manager(std::move(options), registry);
+        const Answers answers = manager.run(request);
+        return arguments.raw ? showRaw(answers, request.operation, arguments.format)
+                             : show(answers, request, arguments.format);
+    } catch (const UnknownClass& error) {
+        return {"", {CMPI_RC_ERR_INVALID_CLASS, error.what()}};
+    }
+}
+
+}  // namespace
+
+Outcome runCommand(const Arguments& arguments) {
+    if (arguments.format == Format::mof && (arguments.raw || !arguments.operation)) {
+        throw UsageError("--format mof shows instances; use text or json with --raw and for classes");
+    }
+    const Locations locations = findLocations(arguments);
+    const Schema schema = readSchema(locations);
+    if (arguments.operation) {
+        return runRequest(arguments, locations, schema);
+    }
+    const std::vector<ListedClass> classes = listClasses(schema, readRegistrations(locations));
+    return {arguments.format == Format::json ? json::format(classes) : text::format(classes)};
+}
+
+}  // namespace cimhost

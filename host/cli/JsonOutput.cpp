@@ -1,0 +1,168 @@
+#include "cli/JsonOutput.h"
+
+#include <nlohmann/json.hpp>
+
+#include "cli/StatusText.h"
+#include "schema/CimType.h"
+#include "schema/ObjectPathText.h"
+#include "schema/Text.h"
+
+namespace cimhost::json {
+namespace {
+
+using Json = nlohmann::ordered_json;
+
+Json pathJson(const ObjectPath& path);
+Json instanceJson(const Instance& instance);
+
+struct ScalarJson {
+    Json operator()(std::monostate) const { return nullptr; }
+    Json operator()(Char16 value) const {
+        std::string text;
+        appendUtf8(text, value.code);
+        return text;
+    }
+    Json operator()(const DateTime& value) const { return value.text; }
+    Json operator()(const std::shared_ptr<const ObjectPath>& value) const {
+        return value ? pathJson(*value) : Json(nullptr);
+    }
+    Json operator()(const std::shared_ptr<const Instance>& value) const {
+        return value ? instanceJson(*value) : Json(nullptr);
+    }
+    template <typename Plain>
+    Json operator()(const Plain& value) const {
+        return value;
+    }
+};
+
+Json contentJson(const Value& value) {
+    if (value.isNull || (!value.isArray && value.elements.empty())) {
+        return nullptr;
+    }
+    if (!value.isArray) {
+        return std::visit(ScalarJson{}, value.elements.front());
+    }
+    Json list = Json::array();
+    for (const Scalar& element : value.elements) {
+        list.push_back(std::visit(ScalarJson{}, element));
+    }
+    return list;
+}
+
+Json valueJson(const Value& value) {
+    return {{"type", typeName(value.type)}, {"array", value.isArray}, {"value", contentJson(value)}};
+}
+
+Json namedJson(const std::vector<NamedValue>& values) {
+    Json object = Json::object();
+    for (const NamedValue& value : values) {
+        object[value.name] = valueJson(value.value);
+    }
+    return object;
+}
+
+Json pathJson(const ObjectPath& path) {
+    return {{"uri", formatObjectPath(path)},
+            {"host", path.host.empty() ? Json(nullptr) : Json(path.host)},
+            {"namespace", path.nameSpace},
+            {"class", path.className},
+            {"keys", namedJson(path.keys)}};
+}
+
+Json instanceJson(const Instance& instance) {
+    return {{"path", pathJson(instance.path)}, {"properties", namedJson(instance.properties)}};
+}
+
+template <typename Convert, typename Item>
+Json listJson(const std::vector<Item>& items, Convert convert) {
+    Json list = Json::array();
+    for (const Item& item : items) {
+        list.push_back(convert(item));
+    }
+    return list;
+}
+
+Json textOrNull(const std::string& text) {
+    return text.empty() ? Json(nullptr) : Json(text);
+}
+
+struct EventJson {
+    Json operator()(const Instance& instance) const {
+        return {{"kind", "instance"}, {"instance", instanceJson(instance)}};
+    }
+    Json operator()(const ObjectPath& path) const { return {{"kind", "objectPath"}, {"objectPath", pathJson(path)}}; }
+    Json operator()(const Value& value) const { return {{"kind", "data"}, {"data", valueJson(value)}}; }
+    Json operator()(const ErrorInfo& error) const {
+        return {{"kind", "error"},
+                {"code", static_cast<int>(error.statusCode)},
+                {"name", codeName(error.statusCode)},
+                {"message", error.message ? Json(*error.message) : Json(nullptr)}};
+    }
+    Json operator()(const Done&) const { return {{"kind", "done"}}; }
+};
+
+Json answerJson(const RawAnswer& answer) {
+    Json returned = Json::array();
+    for (const ResultEvent& event : answer.events) {
+        returned.push_back(std::visit(EventJson{}, event));
+    }
+    const bool hasText = answer.hasMessage || answer.threw;
+    return {{"status",
+             {{"code", static_cast<int>(answer.status.rc)},
+              {"name", codeName(answer.status.rc)},
+              {"message", hasText ? Json(answer.status.message) : Json(nullptr)}}},
+            {"exception", answer.threw},
+            {"returned", returned},
+            {"returnDoneCount", answer.doneCount()}};
+}
+
+Json providerJson(const ProviderRegistration& provider) {
+    return {{"provider", provider.provider},         {"location", provider.location},
+            {"instance", provider.instance},         {"association", provider.association},
+            {"namespaces", provider.nameSpaces},     {"group", textOrNull(provider.group)},
+            {"unload", textOrNull(provider.unload)}, {"source", provider.source}};
+}
+
+Json classJson(const ListedClass& listed) {
+    Json object = {{"class", listed.name}, {"inSchema", listed.definition != nullptr}};
+    object["superclass"] = listed.definition != nullptr ? textOrNull(listed.definition->superclass) : Json(nullptr);
+    object["association"] = listed.definition != nullptr && listed.definition->isAssociation();
+    object["keys"] = Json::array();
+    if (listed.definition != nullptr) {
+        object["keys"] = listJson(listed.definition->keys(), [](const Property* key) { return Json(key->name); });
+    }
+    object["providers"] = listJson(listed.providers, providerJson);
+    return object;
+}
+
+std::string dumped(const Json& document) {
+    return document.dump(2, ' ', false, Json::error_handler_t::replace) + "\n";
+}
+
+}  // namespace
+
+std::string format(const std::vector<Instance>& instances) {
+    return dumped(listJson(instances, instanceJson));
+}
+
+std::string format(const Instance& instance) {
+    return dumped(instanceJson(instance));
+}
+
+std::string format(const std::vector<ObjectPath>& paths) {
+    return dumped(listJson(paths, pathJson));
+}
+
+std::string format(const ObjectPath& path) {
+    return dumped(pathJson(path));
+}
+
+std::string format(const std::vector<RawAnswer>& answers) {
+    return dumped({{"answers", listJson(answers, answerJson)}});
+}
+
+std::string format(const std::vector<ListedClass>& classes) {
+    return dumped(listJson(classes, classJson));
+}
+
+}  // namespace cimhost::json

@@ -1,0 +1,132 @@
+#include "cli/TextOutput.h"
+
+#include <algorithm>
+
+#include "cli/StatusText.h"
+#include "cli/Words.h"
+#include "schema/CimType.h"
+#include "schema/MofWriter.h"
+#include "schema/ObjectPathText.h"
+
+namespace cimhost::text {
+namespace {
+
+using Row = std::vector<std::string>;
+
+/** The rows with their columns under each other; nothing is filled up after the last column. */
+std::string aligned(const std::vector<Row>& rows, const std::string& indent) {
+    std::vector<std::size_t> widths;
+    for (const Row& row : rows) {
+        widths.resize(std::max(widths.size(), row.size()));
+        for (std::size_t i = 0; i < row.size(); ++i) {
+            widths[i] = std::max(widths[i], row[i].size());
+        }
+    }
+    std::string text;
+    for (const Row& row : rows) {
+        std::string line = indent;
+        for (std::size_t i = 0; i < row.size(); ++i) {
+            line += row[i];
+            line += i + 1 < row.size() ? std::string(widths[i] - row[i].size() + 2, ' ') : "";
+        }
+        text += line + "\n";
+    }
+    return text;
+}
+
+std::string valueText(const Value& value) {
+    if (value.type == CMPI_ref && !value.isArray && !value.isNull && !value.elements.empty()) {
+        const auto* path = std::get_if<std::shared_ptr<const ObjectPath>>(&value.elements.front());
+        if (path != nullptr && *path != nullptr) {
+            return formatObjectPath(**path);
+        }
+    }
+    return formatMof(value);
+}
+
+std::string instanceText(const Instance& instance, const std::string& indent) {
+    std::vector<Row> rows;
+    for (const NamedValue& property : instance.properties) {
+        const std::string type = std::string(typeName(property.value.type)) + (property.value.isArray ? "[]" : "");
+        rows.push_back({property.name, type, valueText(property.value)});
+    }
+    return formatObjectPath(instance.path) + "\n" + aligned(rows, indent + "  ");
+}
+
+struct EventText {
+    std::string operator()(const Instance& instance) const { return "instance " + instanceText(instance, "   "); }
+    std::string operator()(const ObjectPath& path) const { return "object path " + formatObjectPath(path) + "\n"; }
+    std::string operator()(const Value& value) const {
+        return "data " + std::string(typeName(value.type)) + (value.isArray ? "[] " : " ") + valueText(value) + "\n";
+    }
+    std::string operator()(const ErrorInfo& error) const {
+        return errorText({error.statusCode, error.message.value_or("")}) + "\n";
+    }
+    std::string operator()(const Done&) const { return "done\n"; }
+};
+
+std::string answerText(const RawAnswer& answer) {
+    std::string text = "status: " + std::to_string(answer.status.rc) + " (" + codeName(answer.status.rc) + ")\n";
+    if (answer.hasMessage || answer.threw) {
+        const Value message{CMPI_string, false, false, {answer.status.message}};
+        text += (answer.threw ? "exception: " : "message: ") + formatMof(message) + "\n";
+    }
+    int number = 0;
+    for (const ResultEvent& event : answer.events) {
+        text += std::to_string(++number) + ". " + std::visit(EventText{}, event);
+    }
+    return text + "returnDone: " + std::to_string(answer.doneCount()) + "\n";
+}
+
+Row providerRow(const ListedClass& listed, const ProviderRegistration& provider) {
+    std::vector<std::string> interfaces;
+    if (provider.instance) {
+        interfaces.push_back("instance");
+    }
+    if (provider.association) {
+        interfaces.push_back("association");
+    }
+    return {listed.name, joined(interfaces, ","), provider.provider, "lib" + provider.location + ".so",
+            joined(provider.nameSpaces, ",") + (listed.definition == nullptr ? "  (not in the schema)" : "")};
+}
+
+}  // namespace
+
+std::string format(const std::vector<Instance>& instances) {
+    std::string text;
+    for (const Instance& instance : instances) {
+        text += (text.empty() ? "" : "\n") + instanceText(instance, "");
+    }
+    return text;
+}
+
+std::string format(const std::vector<ObjectPath>& paths) {
+    std::string text;
+    for (const ObjectPath& path : paths) {
+        text += formatObjectPath(path) + "\n";
+    }
+    return text;
+}
+
+std::string format(const std::vector<RawAnswer>& answers) {
+    std::string text;
+    for (const RawAnswer& answer : answers) {
+        text += (text.empty() ? "" : "\n") + answerText(answer);
+    }
+    return text;
+}
+
+std::string format(const std::vector<ListedClass>& classes) {
+    std::vector<Row> rows;
+    for (const ListedClass& listed : classes) {
+        for (const ProviderRegistration& provider : listed.providers) {
+            rows.push_back(providerRow(listed, provider));
+        }
+        if (listed.providers.empty()) {
+            rows.push_back({listed.name, "-"});
+        }
+    }
+    return aligned(rows, "");
+}
+
+}  // namespace cimhost::text

@@ -1,0 +1,105 @@
+#include <gmock/gmock.h>
+#include <sys/stat.h>
+
+#include "host/cli/Program.h"
+#include "host/schema/Schemas.h"
+
+namespace cimhost::test {
+namespace {
+
+using testing::AllOf;
+using testing::HasSubstr;
+using testing::StartsWith;
+
+Environment testEnvironment() {
+    return {"CIMHOST_SCHEMA=" + dataFile("test.mof"), "CIMHOST_REGISTRATION=" + dataFile("test.reg"),
+            std::string("CIMHOST_LIBRARY_PATH=/:") + PROVIDER_DIRECTORY};
+}
+
+TEST(Location, ComesFromTheEnvironment) {
+    const Ended listed = runBare({"ein", "Test_Box"}, testEnvironment());
+    EXPECT_EQ(listed.status, 0) << listed.error;
+    EXPECT_THAT(listed.output, HasSubstr("Test_Box.Name=\"A\""));
+}
+
+TEST(Location, OptionsComeBeforeTheEnvironment) {
+    const TemporaryDirectory directory;
+    const std::string other = directory.write("other.mof", "class Other { [Key] string K; };");
+    const Ended listed = runBare({"--schema", other, "classes"}, testEnvironment());
+    EXPECT_THAT(listed.output, AllOf(StartsWith("Other "), HasSubstr("Test_Box"), HasSubstr("(not in the schema)")));
+}
+
+TEST(Location, ADirectoryStandsForItsFilesAndSeveralMayBeNamed) {
+    const TemporaryDirectory directory;
+    directory.write("a/2.mof", "class Two : One {};");
+    directory.write("a/1.mof", "class One { [Key] string K; };");
+    directory.write("a/notes.txt", "no MOF");
+    const std::string three = directory.write("3.mof", "class Three : Two {};");
+    const std::string list = "CIMHOST_SCHEMA=" + (directory.path / "a").string() + ":" + three;
+    const std::string registration = "CIMHOST_REGISTRATION=" + directory.write("x.reg", "#").string();
+    EXPECT_EQ(runBare({"classes"}, {list, registration}).output, "One    -\nTwo    -\nThree  -\n");
+    EXPECT_EQ(
+        runBare({"--schema", (directory.path / "a").string(), "--schema", three, "classes"}, {registration}).output,
+        "One    -\nTwo    -\nThree  -\n");
+}
+
+TEST(Location, WithoutAnyItIsTheDataDirectoryBesideTheProgram) {
+    const Ended listed = runBare({"classes"});
+    EXPECT_EQ(listed.status, 0) << listed.error;
+    EXPECT_NE(listed.output, "");
+    EXPECT_EQ(listed.error, "");
+}
+
+struct MissingFile {
+    std::vector<std::string> arguments;
+    const char* complaint;
+};
+void PrintTo(const MissingFile& missing, std::ostream* out) {
+    *out << missing.arguments.front();
+}
+
+class CannotLoad : public testing::TestWithParam<MissingFile> {};
+TEST_P(CannotLoad, IsExitStatus3WithAReason) {
+    const Ended refused = runBare(GetParam().arguments, testEnvironment());
+    EXPECT_EQ(refused.status, 3);
+    EXPECT_EQ(refused.output, "");
+    EXPECT_THAT(refused.error, AllOf(StartsWith("cimhost: "), HasSubstr(GetParam().complaint)));
+}
+INSTANTIATE_TEST_SUITE_P(
+    Files, CannotLoad,
+    testing::Values(
+        MissingFile{{"--schema", "/no/such.mof", "classes"}, "/no/such.mof: this file does not exist"},
+        MissingFile{{"--registration", "/no/such.reg", "classes"}, "/no/such.reg: this file does not exist"},
+        MissingFile{{"--library-path", "/no/such", "classes"}, "/no/such: there is no such directory of libraries"},
+        MissingFile{{"--schema", dataFile("test.reg"), "classes"}, "test.reg:1:3: expected \"pragma\" after #"},
+        MissingFile{{"--registration", dataFile("test.mof"), "classes"}, "test.mof:1: expected [CLASS]"},
+        MissingFile{{"ei", "Test_NoLibrary"}, "libno_such_library.so"},
+        MissingFile{{"ei", "Test_NoLibrary"}, "--library-path"},
+        MissingFile{{"ei", "Test_NoFactory"}, "NoSuchProvider_Create_InstanceMI"}));
+
+TEST(CannotLoad, ADirectoryWithoutSuchFilesNamesTheOption) {
+    const TemporaryDirectory directory;
+    const Ended refused = runBare({"--schema", directory.path.string(), "classes"}, testEnvironment());
+    EXPECT_EQ(refused.status, 3);
+    EXPECT_THAT(refused.error, AllOf(HasSubstr("no schema"), HasSubstr("--schema"), HasSubstr("CIMHOST_SCHEMA")));
+}
+
+TEST(CannotLoad, ALibraryThatIsNone) {
+    const TemporaryDirectory directory;
+    directory.write("libcli_test_provider.so", "this is no library");
+    const Ended refused = runBare({"--library-path", directory.path.string(), "ei", "Test_Box"}, testEnvironment());
+    EXPECT_EQ(refused.status, 3);
+    EXPECT_THAT(refused.error, HasSubstr("libcli_test_provider.so"));
+}
+
+TEST(Output, ThatCannotBeWrittenIsExitStatus4) {
+    for (const std::vector<std::string>& arguments :
+         {std::vector<std::string>{"ei", "Test_Box"}, {"--help"}, {"--format", "json", "classes"}}) {
+        const Ended refused = runBare(arguments, testEnvironment(), "/dev/full");
+        EXPECT_EQ(refused.status, 4) << arguments.front();
+        EXPECT_THAT(refused.error, StartsWith("cimhost: the output cannot be written: ")) << arguments.front();
+    }
+}
+
+}  // namespace
+}  // namespace cimhost::test

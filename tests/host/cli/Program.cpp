@@ -1,0 +1,86 @@
+#include "host/cli/Program.h"
+
+#include <fcntl.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <cstring>
+#include <fstream>
+#include <sstream>
+
+#include "host/schema/Schemas.h"
+
+namespace cimhost::test {
+namespace {
+
+std::string contentOf(const std::filesystem::path& file) {
+    std::ifstream stream(file, std::ios::binary);
+    std::ostringstream text;
+    text << stream.rdbuf();
+    return text.str();
+}
+
+/** The arrays that exec wants, ended by a null pointer. */
+std::vector<char*> pointersTo(std::vector<std::string>& texts) {
+    std::vector<char*> pointers;
+    for (std::string& text : texts) {
+        pointers.push_back(text.data());
+    }
+    pointers.push_back(nullptr);
+    return pointers;
+}
+
+/** The environment of this process without the program's own variables, and with those given. */
+std::vector<std::string> environmentWith(const Environment& more) {
+    std::vector<std::string> variables = more;
+    for (char** each = environ; *each != nullptr; ++each) {
+        if (std::strncmp(*each, "CIMHOST_", 8) != 0) {
+            variables.emplace_back(*each);
+        }
+    }
+    return variables;
+}
+
+void redirect(const std::string& file, int descriptor) {
+    const int opened = open(file.c_str(), O_WRONLY | O_CREAT, 0600);
+    if (opened < 0 || dup2(opened, descriptor) < 0) {
+        _exit(125);
+    }
+}
+
+}  // namespace
+
+Ended runBare(const std::vector<std::string>& arguments, const Environment& environment,
+              const std::string& outputFile) {
+    const TemporaryDirectory directory;
+    const std::string output = outputFile.empty() ? (directory.path / "output").string() : outputFile;
+    const std::string error = directory.path / "error";
+    std::vector<std::string> words = arguments;
+    words.insert(words.begin(), CIMHOST_PROGRAM);
+    std::vector<std::string> variables = environmentWith(environment);
+    const std::vector<char*> wordPointers = pointersTo(words);
+    const std::vector<char*> variablePointers = pointersTo(variables);
+    const pid_t child = fork();
+    if (child == 0) {
+        redirect(output, STDOUT_FILENO);
+        redirect(error, STDERR_FILENO);
+        execve(CIMHOST_PROGRAM, wordPointers.data(), variablePointers.data());
+        _exit(126);
+    }
+    int status = 0;
+    waitpid(child, &status, 0);
+    return {WIFEXITED(status) ? WEXITSTATUS(status) : -1, outputFile.empty() ? contentOf(output) : "",
+            contentOf(error)};
+}
+
+Ended run(std::vector<std::string> arguments) {
+    arguments.insert(arguments.begin(), {"--schema", dataFile("test.mof"), "--registration", dataFile("test.reg"),
+                                         "--library-path", PROVIDER_DIRECTORY});
+    return runBare(arguments);
+}
+
+std::string dataFile(const std::string& name) {
+    return std::string(DATA_DIRECTORY "/") + name;
+}
+
+}  // namespace cimhost::test

@@ -1,0 +1,50 @@
+#include <gmock/gmock.h>
+
+#include "host/cli/Program.h"
+
+namespace cimhost::test {
+namespace {
+
+TEST(RawOutput, ShowsEverythingThatTheProviderReturnedInOrder) {
+    const Ended modified = run({"--raw", "mi", "Test_Box.Name=\"A\"", "Size=5", "Note="});
+    EXPECT_EQ(modified.status, 0);
+    EXPECT_EQ(modified.output, R"(status: 0 (CMPI_RC_OK)
+1. instance root/cimv2:Test_Box.Name="A"
+     Size  uint32  5
+     Note  string  ""
+2. data string "Size"
+3. data string "Note"
+returnDone: 0
+)");
+}
+
+TEST(RawOutput, CountsEveryReturnDone) {
+    const Ended got = run({"--raw", "gi", "Test_Box.Name=\"none\""});
+    EXPECT_EQ(got.output, "status: 0 (CMPI_RC_OK)\n1. done\n2. done\nreturnDone: 2\n");
+    EXPECT_EQ(got.status, 0) << "the provider's status, not what an object manager makes of it";
+}
+
+TEST(RawOutput, ShowsTheStatusOfAFailureAndSaysItOnStandardErrorToo) {
+    const Ended failed = run({"--raw", "gi", "Test_Answer.Code=2"});
+    EXPECT_EQ(failed.status, 1);
+    EXPECT_EQ(failed.output,
+              "status: 2 (CMPI_RC_ERR_ACCESS_DENIED)\nmessage: \"as you\\nlike \\\"it\\\"\"\nreturnDone: 0\n");
+    EXPECT_EQ(failed.error, "cimhost: error 2 (CMPI_RC_ERR_ACCESS_DENIED): as you\\nlike \"it\"\n");
+}
+
+TEST(RawOutput, TellsAnExceptionFromAMessage) {
+    const Ended thrown = run({"--raw", "gi", "Test_Answer.Code=999"});
+    EXPECT_EQ(thrown.status, 1);
+    EXPECT_THAT(thrown.output, testing::StartsWith("status: 1 (CMPI_RC_ERR_FAILED)\nexception: "));
+    EXPECT_THAT(thrown.output, testing::HasSubstr("wit's end"));
+}
+
+TEST(RawOutput, WithoutAProviderIsOnlyTheError) {
+    const Ended failed = run({"--raw", "ei", "Test_Unserved"});
+    EXPECT_EQ(failed.status, 1);
+    EXPECT_EQ(failed.output, "");
+    EXPECT_THAT(failed.error, testing::StartsWith("cimhost: error 5 (CMPI_RC_ERR_INVALID_CLASS): "));
+}
+
+}  // namespace
+}  // namespace cimhost::test
