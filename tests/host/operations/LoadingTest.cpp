@@ -1,0 +1,140 @@
+#include <dlfcn.h>
+
+#include <thread>
+
+#include "OperationsFixture.h"
+#include "operations/RequestRunner.h"
+#include "support/Files.h"
+
+namespace {
+
+using cimhost::LibraryError;
+
+class LoadingTest : public OperationsTest {
+protected:
+    void ask(const char* className) { manager().enumerateInstances({}, classPath(className), {}); }
+
+    /** The text of the LibraryError that asking for a class ends with; empty when it does not. */
+    std::string errorOf(const char* className) {
+        try {
+            ask(className);
+            return {};
+        } catch (const LibraryError& error) {
+            return error.what();
+        }
+    }
+
+    static bool isLoaded(const char* library) {
+        void* handle = dlopen((std::string(TEST_PROVIDERS) + "/" + library).c_str(), RTLD_NOW | RTLD_NOLOAD);
+        if (handle != nullptr) {
+            dlclose(handle);
+        }
+        return handle != nullptr;
+    }
+};
+
+TEST_F(LoadingTest, FactoriesAreCalledOnceAnInterface) {
+    ask("Sample_Thing");
+    ask("Sample_Silent");
+    manager().associatorNames({}, named("Sample_Thing", "x"), {});
+    manager().associatorNames({}, named("Sample_Thing", "x"), {});
+    EXPECT_THAT(log, testing::ElementsAre("instance factory", "association factory"));
+}
+
+TEST_F(LoadingTest, NothingIsLoadedBeforeItIsNeeded) {
+    manager();
+    EXPECT_FALSE(isLoaded("libSampleProvider.so"));
+    ask("Missing");
+    EXPECT_FALSE(isLoaded("libSampleProvider.so"));
+}
+
+TEST_F(LoadingTest, TheEndCleansUpAndUnloads) {
+    ask("Sample_Thing");
+    manager().associatorNames({}, named("Sample_Thing", "x"), {});
+    EXPECT_TRUE(isLoaded("libSampleProvider.so"));
+    log.clear();
+    started.reset();
+    EXPECT_THAT(log, testing::ElementsAre("instance cleanup at the end", "association cleanup at the end"));
+    EXPECT_FALSE(isLoaded("libSampleProvider.so"));
+}
+
+TEST_F(LoadingTest, AProviderThatWantsToStayStays) {
+    ask("Other_Thing");
+    started.reset();
+    EXPECT_TRUE(isLoaded("libOtherProvider.so"));
+}
+
+TEST_F(LoadingTest, TheGenericFactoryIsToldTheName) {
+    const auto found = manager().enumerateInstances({}, classPath("Other_Thing"), {});
+    ASSERT_EQ(found.value.size(), 1U);
+    EXPECT_EQ(testsupport::textOf(found.value.front().properties, "Provider"), "Anything");
+}
+
+TEST_F(LoadingTest, AMissingFunctionIsNotSupported) {
+    const auto found = manager().getInstance({}, classPath("Other_Thing"), {});
+    EXPECT_EQ(found.status.rc, CMPI_RC_ERR_NOT_SUPPORTED);
+}
+
+TEST_F(LoadingTest, AMissingLibraryIsALibraryError) {
+    EXPECT_EQ(errorOf("Unloadable"), "libDoesNotExist.so is in none of these folders: /nonexistent, " TEST_PROVIDERS);
+}
+
+TEST_F(LoadingTest, AFileThatIsNoLibraryIsALibraryError) {
+    const testsupport::TempDirectory folder;
+    const std::string file = folder.withSlash() + "libText.so";
+    testsupport::writeFile(file, "no library");
+    add("Text", "Text", file.c_str(), true, false);
+    EXPECT_THAT(errorOf("Text"), testing::HasSubstr(file));
+}
+
+TEST_F(LoadingTest, AMissingFactoryIsALibraryError) {
+    add("Wrong_Thing", "Wrong", "SampleProvider", true, false);
+    EXPECT_THAT(errorOf("Wrong_Thing"), testing::HasSubstr("Wrong_Create_InstanceMI"));
+}
+
+TEST_F(LoadingTest, AFailingFactoryIsALibraryError) {
+    for (const char* provider : {"Refusing", "Null", "Throwing", "Selfish"}) {
+        add((std::string(provider) + "_Thing").c_str(), provider, "OtherProvider", true, false);
+    }
+    EXPECT_THAT(errorOf("Refusing_Thing"), testing::HasSubstr("no licence"));
+    EXPECT_THAT(errorOf("Null_Thing"), testing::HasSubstr("no interface"));
+    EXPECT_THAT(errorOf("Throwing_Thing"), testing::HasSubstr("no luck"));
+    EXPECT_THAT(errorOf("Selfish_Thing"), testing::HasSubstr("needs itself"));
+}
+
+TEST_F(LoadingTest, AFailedFactoryIsTriedAgain) {
+    add("Late_Thing", "Late", "OtherProvider", true, false);
+    EXPECT_NE(errorOf("Late_Thing"), "");
+    EXPECT_NE(errorOf("Late_Thing"), "");
+    EXPECT_EQ(errorOf("Late_Thing"), "");
+}
+
+TEST_F(LoadingTest, SeveralThreadsStartAProviderOnce) {
+    manager();
+    const auto work = [this] {
+        for (int i = 0; i < 50; ++i) {
+            EXPECT_TRUE(manager().enumerateInstances({}, classPath("Sample_CallsOther_Thing"), {}).ok());
+        }
+    };
+    std::thread first(work);
+    std::thread second(work);
+    first.join();
+    second.join();
+    EXPECT_THAT(log, testing::ElementsAre("instance factory"));
+}
+
+TEST_F(LoadingTest, ALaterRegistrationReplacesAnEarlierOne) {
+    add("SAMPLE_THING", "Anything", "OtherProvider", true, false);
+    const auto found = manager().enumerateInstances({}, classPath("Sample_Thing"), {});
+    ASSERT_EQ(found.value.size(), 1U);
+    EXPECT_EQ(found.value.front().path.className, "Other_Thing");
+}
+
+TEST_F(LoadingTest, AnInterfaceRefusesOperationsOfTheOtherKind) {
+    cimhost::Request request;
+    request.operation = cimhost::Operation::associators;
+    CMPIInstanceMI none{};
+    EXPECT_THROW(runRequest(manager().broker(), &none, request), std::invalid_argument);
+}
+
+}  // namespace

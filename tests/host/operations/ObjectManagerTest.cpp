@@ -1,0 +1,235 @@
+#include "OperationsFixture.h"
+
+namespace {
+
+using cimhost::Instance;
+using cimhost::ObjectPath;
+using testsupport::text;
+using testsupport::textOf;
+
+class ObjectManagerTest : public OperationsTest {
+protected:
+    cimhost::Answer<ObjectPath> create(const char* className, const char* name) {
+        return manager().createInstance({}, named(className, name), {});
+    }
+};
+
+TEST_F(ObjectManagerTest, CreatesFindsAndDeletes) {
+    const auto created = create("Sample_Thing", "a");
+    ASSERT_TRUE(created.ok()) << created.status.message;
+    EXPECT_EQ(testsupport::toText(created.value), "root/cimv2:Sample_Thing.Name=\"a\"");
+    const auto names = manager().enumerateInstanceNames({}, classPath("Sample_Thing"));
+    ASSERT_EQ(names.value.size(), 1U);
+    EXPECT_EQ(textOf(names.value.front().keys, "Name"), "a");
+    const auto found = manager().getInstance({}, created.value, {});
+    EXPECT_EQ(textOf(found.value.properties, "Name"), "a");
+    EXPECT_TRUE(manager().deleteInstance({}, created.value).ok());
+    EXPECT_TRUE(manager().enumerateInstances({}, classPath("Sample_Thing"), {}).value.empty());
+}
+
+TEST_F(ObjectManagerTest, GetInstanceWithoutAnInstanceIsNotFound) {
+    const auto found = manager().getInstance({}, named("Sample_Thing", "missing"), {});
+    EXPECT_EQ(found.status.rc, CMPI_RC_ERR_NOT_FOUND);
+    EXPECT_THAT(found.status.message, testing::HasSubstr("Sample_Thing.Name=\"missing\""));
+}
+
+TEST_F(ObjectManagerTest, CreateInstanceMayReturnAnInstance) {
+    const auto created = create("Sample_ReturnsInstance", "b");
+    ASSERT_TRUE(created.ok());
+    EXPECT_EQ(testsupport::toText(created.value), "root/cimv2:Sample_Thing.Name=\"b\"");
+}
+
+TEST_F(ObjectManagerTest, CreateInstanceMustReturnSomething) {
+    const auto created = create("Sample_Silent", "c");
+    EXPECT_EQ(created.status.rc, CMPI_RC_ERR_FAILED);
+    EXPECT_THAT(created.status.message, testing::HasSubstr("returned neither path nor instance"));
+}
+
+TEST_F(ObjectManagerTest, CreateHandsOverKeysThenProperties) {
+    Instance given;
+    given.properties = {testsupport::named("Colour", text("red"))};
+    ASSERT_TRUE(manager().createInstance({}, named("Sample_Thing", "d"), given).ok());
+    const auto found = manager().getInstance({}, named("Sample_Thing", "d"), {});
+    EXPECT_EQ(textOf(found.value.properties, "Text"), "Name=d;Colour=red;");
+}
+
+TEST_F(ObjectManagerTest, CreateHandsOverNoKeyTwice) {
+    Instance given;
+    given.properties = {testsupport::named("Colour", text("red")), testsupport::named("NAME", text("e"))};
+    ASSERT_TRUE(manager().createInstance({}, named("Sample_Thing", "e"), given).ok());
+    const auto found = manager().getInstance({}, named("Sample_Thing", "e"), {});
+    EXPECT_EQ(textOf(found.value.properties, "Text"), "Colour=red;NAME=e;");
+}
+
+TEST_F(ObjectManagerTest, ModifyHandsOverExactlyTheProperties) {
+    create("Sample_Thing", "f");
+    Instance given;
+    given.properties = {testsupport::named("Colour", text("blue"))};
+    ASSERT_TRUE(manager().modifyInstance({}, named("Sample_Thing", "f"), given, {}).ok());
+    const auto found = manager().getInstance({}, named("Sample_Thing", "f"), {});
+    EXPECT_EQ(textOf(found.value.properties, "Text"), "Colour=blue;");
+}
+
+TEST_F(ObjectManagerTest, AFailureWithoutAMessageGetsOne) {
+    const auto status = manager().deleteInstance({}, named("Sample_Thing", "missing"));
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_NOT_FOUND);
+    EXPECT_FALSE(status.message.empty());
+}
+
+TEST_F(ObjectManagerTest, AFailureKeepsItsMessageAndGivesNoResults) {
+    const auto found = manager().enumerateInstances({}, classPath("Sample_Failing"), {});
+    EXPECT_EQ(found.status.rc, CMPI_RC_ERR_ACCESS_DENIED);
+    EXPECT_EQ(found.status.message, "not for you");
+    EXPECT_TRUE(found.value.empty());
+}
+
+TEST_F(ObjectManagerTest, AnUnknownClassIsInvalid) {
+    const auto found = manager().enumerateInstances({}, classPath("Missing"), {});
+    EXPECT_EQ(found.status.rc, CMPI_RC_ERR_INVALID_CLASS);
+    EXPECT_THAT(found.status.message, testing::AllOf(testing::HasSubstr("Missing"), testing::HasSubstr("root/cimv2")));
+    EXPECT_EQ(manager().enumerateInstances({}, classPath("Sample_OtherLink"), {}).status.rc, CMPI_RC_ERR_INVALID_CLASS)
+        << "registered as an association only";
+}
+
+TEST_F(ObjectManagerTest, AnUnknownNameSpaceIsInvalid) {
+    const auto found = manager().enumerateInstances({}, testsupport::objectPath("root/nowhere", "Sample_Thing"), {});
+    EXPECT_EQ(found.status.rc, CMPI_RC_ERR_INVALID_NAMESPACE);
+    EXPECT_THAT(found.status.message, testing::HasSubstr("root/nowhere"));
+}
+
+TEST_F(ObjectManagerTest, NamesIgnoreLetterCase) {
+    EXPECT_TRUE(manager().enumerateInstances({}, testsupport::objectPath("ROOT/cimV2", "sample_THING"), {}).ok());
+}
+
+TEST_F(ObjectManagerTest, ResultsOfTheWrongKindAreAFailure) {
+    const auto names = manager().enumerateInstanceNames({}, classPath("Sample_WrongKind"));
+    EXPECT_EQ(names.status.rc, CMPI_RC_ERR_FAILED);
+    EXPECT_THAT(names.status.message, testing::HasSubstr("EnumerateInstanceNames"));
+}
+
+TEST_F(ObjectManagerTest, APropertyListGoesToTheProvider) {
+    create("Sample_Thing", "g");
+    const auto found =
+        manager().enumerateInstances({}, classPath("Sample_Thing"), std::vector<std::string>{"Wanted", "Also"});
+    ASSERT_EQ(found.value.size(), 1U);
+    EXPECT_EQ(textOf(found.value.front().properties, "Text"), "Wanted");
+}
+
+TEST_F(ObjectManagerTest, CompletesTheContext) {
+    const auto plain = manager().enumerateInstances({}, classPath("Sample_Context"), {});
+    EXPECT_EQ(textOf(plain.value.front().properties, "Name"), "root/cimv2;;0");
+    const cimhost::ContextEntries given{testsupport::named("cmpiPrincipal", text("anna")),
+                                        testsupport::named(CMPIInvocationFlags, testsupport::uint32(4))};
+    const auto own = manager().enumerateInstances(given, classPath("Sample_Context"), {});
+    EXPECT_EQ(textOf(own.value.front().properties, "Name"), "root/cimv2;anna;4");
+}
+
+TEST_F(ObjectManagerTest, OptionsGiveEveryRequestContextEntries) {
+    options.context = {testsupport::named(CMPIPrincipal, text("daemon"))};
+    const auto found = manager().enumerateInstances({}, classPath("Sample_Context"), {});
+    EXPECT_EQ(textOf(found.value.front().properties, "Name"), "root/cimv2;daemon;0");
+}
+
+TEST_F(ObjectManagerTest, AnExceptionOfAProviderIsAFailure) {
+    const auto thrown = manager().enumerateInstances({}, classPath("Sample_Throwing"), {});
+    EXPECT_EQ(thrown.status.rc, CMPI_RC_ERR_FAILED);
+    EXPECT_THAT(thrown.status.message, testing::HasSubstr("out of paper"));
+    EXPECT_EQ(manager().enumerateInstances({}, classPath("Sample_ThrowingOdd"), {}).status.rc, CMPI_RC_ERR_FAILED);
+    EXPECT_TRUE(manager().enumerateInstances({}, classPath("Sample_Thing"), {}).ok()) << "life goes on";
+}
+
+TEST_F(ObjectManagerTest, TheRawAnswerTellsEverything) {
+    cimhost::Request request;
+    request.path = classPath("Sample_Failing");
+    auto failing = manager().run(request);
+    ASSERT_TRUE(failing.ok());
+    ASSERT_EQ(failing.value.size(), 1U);
+    EXPECT_EQ(failing.value.front().status.rc, CMPI_RC_ERR_ACCESS_DENIED);
+    EXPECT_TRUE(failing.value.front().hasMessage);
+    EXPECT_FALSE(failing.value.front().threw);
+    EXPECT_EQ(cimhost::eventsOf<Instance>(failing.value.front().events).size(), 1U);
+    EXPECT_EQ(failing.value.front().doneCount(), 0);
+
+    request.path = classPath("Sample_Throwing");
+    EXPECT_TRUE(manager().run(request).value.front().threw);
+    request.path = classPath("Sample_Thing");
+    EXPECT_EQ(manager().run(request).value.front().doneCount(), 1);
+}
+
+// Up-calls.
+
+TEST_F(ObjectManagerTest, AnUpCallReachesTheSameLibrary) {
+    create("Sample_Thing", "h");
+    const auto found = manager().enumerateInstances({}, classPath("Sample_CallsSample_Thing"), {});
+    ASSERT_EQ(found.value.size(), 1U) << found.status.message;
+    EXPECT_EQ(textOf(found.value.front().properties, "Name"), "h");
+}
+
+TEST_F(ObjectManagerTest, AnUpCallReachesAnotherLibrary) {
+    const auto found = manager().enumerateInstances({}, classPath("Sample_CallsOther_Thing"), {});
+    ASSERT_EQ(found.value.size(), 1U) << found.status.message;
+    EXPECT_EQ(found.value.front().path.className, "Other_Thing");
+}
+
+TEST_F(ObjectManagerTest, UpCallsNest) {
+    const auto found = manager().getInstance({}, named("Sample_Recursive", "3"), {});
+    ASSERT_TRUE(found.ok()) << found.status.message;
+    EXPECT_EQ(textOf(found.value.properties, "Below"), "3>Below=2>Below=1>Below=0>bottom;;;");
+}
+
+TEST_F(ObjectManagerTest, AFailingUpCallTellsTheCaller) {
+    const auto missing = manager().enumerateInstances({}, classPath("Sample_CallsMissing"), {});
+    EXPECT_EQ(missing.status.rc, CMPI_RC_ERR_INVALID_CLASS);
+    EXPECT_THAT(missing.status.message, testing::HasSubstr("Missing"));
+    const auto throwing = manager().enumerateInstances({}, classPath("Sample_CallsSample_Throwing"), {});
+    EXPECT_EQ(throwing.status.rc, CMPI_RC_ERR_FAILED);
+    EXPECT_THAT(throwing.status.message, testing::HasSubstr("out of paper"));
+    const auto unloadable = manager().enumerateInstances({}, classPath("Sample_CallsUnloadable"), {});
+    EXPECT_EQ(unloadable.status.rc, CMPI_RC_ERR_FAILED);
+    EXPECT_THAT(unloadable.status.message, testing::HasSubstr("libDoesNotExist.so"));
+}
+
+// Associations.
+
+TEST_F(ObjectManagerTest, AssociationsGoByTheirClass) {
+    const cimhost::AssociationFilter filter{"sample_link", "Far", "Here", std::nullopt};
+    const auto found = manager().associators({}, named("Sample_Thing", "x"), filter, {});
+    ASSERT_EQ(found.value.size(), 1U) << found.status.message;
+    EXPECT_EQ(textOf(found.value.front().properties, "Asked"), "sample_link,Far,Here,none");
+}
+
+TEST_F(ObjectManagerTest, WithoutAClassAllAssociationsAreAsked) {
+    const auto found = manager().associatorNames({}, named("Sample_Thing", "x"), {});
+    ASSERT_EQ(found.value.size(), 2U);
+    EXPECT_EQ(textOf(found.value[0].keys, "Asked"), "Sample_Link");
+    EXPECT_EQ(textOf(found.value[1].keys, "Asked"), "Sample_OtherLink");
+}
+
+TEST_F(ObjectManagerTest, ASuperclassStandsForItsAssociations) {
+    auto shape = std::make_shared<cimhost::ClassShape>();
+    shape->name = "Sample_OtherLink";
+    shape->superclasses = {"Sample_AnyLink"};
+    options.classShape = [shape](const std::string& name) {
+        return name == shape->name ? shape : std::shared_ptr<const cimhost::ClassShape>();
+    };
+    const auto found = manager().associatorNames({}, named("Sample_Thing", "x"), {"Sample_AnyLink", {}, {}, {}});
+    ASSERT_EQ(found.value.size(), 1U);
+    EXPECT_EQ(textOf(found.value[0].keys, "Asked"), "Sample_OtherLink");
+}
+
+TEST_F(ObjectManagerTest, AnUnknownAssociationIsInvalid) {
+    const auto found = manager().associators({}, named("Sample_Thing", "x"), {"Sample_Thing", {}, {}, {}}, {});
+    EXPECT_EQ(found.status.rc, CMPI_RC_ERR_INVALID_CLASS);
+    EXPECT_THAT(found.status.message, testing::HasSubstr("No association provider"));
+}
+
+TEST_F(ObjectManagerTest, AProviderThatDoesNotSupportAnAssociationOperationIsPassedOver) {
+    const auto found = manager().references({}, named("Sample_Thing", "x"), {}, {});
+    ASSERT_TRUE(found.ok()) << found.status.message;
+    EXPECT_EQ(found.value.size(), 1U);
+    EXPECT_EQ(manager().references({}, named("Sample_Thing", "x"), {{}, "Sample_OtherLink", {}, {}}, {}).status.rc,
+              CMPI_RC_ERR_NOT_SUPPORTED);
+    EXPECT_EQ(manager().referenceNames({}, named("Sample_Thing", "x"), {}).status.rc, CMPI_RC_ERR_NOT_SUPPORTED);
+}
+
+}  // namespace
