@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "broker/NamedValues.h"
 #include "cli/ExitStatus.h"
 #include "cli/Words.h"
 #include "schema/Literal.h"
@@ -14,12 +15,6 @@ namespace {
 
 bool namesAClass(Operation operation) {
     return operation == Operation::enumerateInstances || operation == Operation::enumerateInstanceNames;
-}
-
-const NamedValue* findNamed(const std::vector<NamedValue>& values, const std::string& name) {
-    const auto found =
-        std::find_if(values.begin(), values.end(), [&](const NamedValue& each) { return sameName(each.name, name); });
-    return found == values.end() ? nullptr : &*found;
 }
 
 const Class& classOf(const ObjectPath& path, const Schema& schema) {

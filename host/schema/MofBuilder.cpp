@@ -74,6 +74,28 @@ const Node* initializerOf(const Node& node) {
     return array != nullptr ? array : findChild<mof::Constant>(node);
 }
 
+const NamedValue* findNamed(const std::vector<NamedValue>& values, std::string_view name) {
+    const auto found =
+        std::find_if(values.begin(), values.end(), [&](const NamedValue& each) { return sameName(each.name, name); });
+    return found == values.end() ? nullptr : &*found;
+}
+
+/** Gives the instance the defaults of its class and its path's keys. */
+void complete(Instance& instance, const Class& declared, const Node& node) {
+    for (const Property& property : declared.properties) {
+        if (!property.defaultValue.isNull && findNamed(instance.properties, property.name) == nullptr) {
+            instance.properties.push_back({property.name, property.defaultValue});
+        }
+    }
+    for (const Property* key : declared.keys()) {
+        const NamedValue* value = findNamed(instance.properties, key->name);
+        if (value == nullptr || value->value.isNull) {
+            fail(node, "the key " + key->name + " has no value");
+        }
+        instance.path.keys.push_back(*value);
+    }
+}
+
 Value trueValue() {
     return singleValue(CMPI_boolean, true);
 }
@@ -243,29 +265,14 @@ void MofBuilder::buildInstance(const Node& node) {
     }
     Instance instance;
     instance.path.className = declared->name;
-    const auto find = [&](std::string_view name) {
-        return std::find_if(instance.properties.begin(), instance.properties.end(),
-                            [&](const NamedValue& each) { return sameName(each.name, name); });
-    };
     for (const Node* assignment : children<mof::Assignment>(node)) {
         NamedValue property = buildAssignment(*assignment, *declared);
-        if (find(property.name) != instance.properties.end()) {
+        if (findNamed(instance.properties, property.name) != nullptr) {
             fail(*assignment, property.name + " is given twice");
         }
         instance.properties.push_back(std::move(property));
     }
-    for (const Property& property : declared->properties) {
-        if (!property.defaultValue.isNull && find(property.name) == instance.properties.end()) {
-            instance.properties.push_back({property.name, property.defaultValue});
-        }
-    }
-    for (const Property* key : declared->keys()) {
-        const auto value = find(key->name);
-        if (value == instance.properties.end() || value->value.isNull) {
-            fail(node, "the key " + key->name + " has no value");
-        }
-        instance.path.keys.push_back(*value);
-    }
+    complete(instance, *declared, node);
     if (const Node* clause = findChild<mof::AliasClause>(node)) {
         aliases.insert_or_assign(findChild<mof::Alias>(*clause)->string(), instance.path);
     }
