@@ -1,0 +1,102 @@
+#include "AssociationFixture.h"
+
+#include "schema/MofWriter.h"
+
+#include <algorithm>
+#include <iterator>
+
+namespace contract {
+
+const char* const threeComputers = R"(
+[[instrumentation.node]]
+type = 1
+path = "/system"
+properties = { "36" = "Example Maker", "108" = "testhost" }
+
+[[instrumentation.node]]
+type = 40
+path = "/system/computer"
+properties = { "36" = "Example Maker", "39" = "Model X - Tower", "108" = "alpha" }
+
+[[instrumentation.node]]
+type = 40
+path = "/system/second_computer 2"
+properties = { "108" = "beta" }
+
+[[instrumentation.node]]
+type = 40
+path = "/system/third"
+properties = { "108" = "gamma" }
+)";
+
+std::string recordFile(const Side& side, const std::vector<std::string>& identifiers) {
+    std::string content = std::to_string(identifiers.size()) + "\n";
+    for (const std::string& identifier : identifiers) {
+        content += identifier + "\n" + side.fields;
+    }
+    return content;
+}
+
+Instance computerSystem(const std::string& name) {
+    return testsupport::instance(computerPath(name),
+                                 {testsupport::named("Name", testsupport::text(name)),
+                                  testsupport::named("ElementName", testsupport::text("Computer " + name)),
+                                  testsupport::named("Caption", testsupport::nullOf(CMPI_string))});
+}
+
+std::vector<std::string> textsOf(const std::vector<ObjectPath>& paths) {
+    std::vector<std::string> texts;
+    std::transform(paths.begin(), paths.end(), std::back_inserter(texts), testsupport::toText);
+    return texts;
+}
+
+std::vector<std::string> textsOf(const std::vector<Instance>& instances) {
+    std::vector<std::string> texts;
+    std::transform(instances.begin(), instances.end(), std::back_inserter(texts), [](const Instance& instance) {
+        return testsupport::toText(instance.path) + " " + cimhost::formatMof(instance);
+    });
+    return texts;
+}
+
+void AssociationTest::haveRecords(const std::vector<std::string>& identifiers) {
+    writeData(side().dataFile, recordFile(side(), identifiers));
+}
+
+void AssociationTest::knowComputers(const std::vector<std::string>& names) {
+    std::vector<Instance> computers;
+    std::transform(names.begin(), names.end(), std::back_inserter(computers), computerSystem);
+    broker.serve("VELKO_ComputerSystem", std::move(computers));
+}
+
+std::string AssociationTest::computer(const std::string& name) {
+    return testsupport::toText(computerPath(name));
+}
+
+std::string AssociationTest::element(const std::string& identifier) {
+    return testsupport::toText(keyedPath(side().element, identifier));
+}
+
+std::string AssociationTest::keylessElement() {
+    return testsupport::toText(classPath(side().element));
+}
+
+std::string AssociationTest::pair(const std::string& computerName, const std::string& identifier) {
+    return testsupport::toText(association(computerPath(computerName), keyedPath(side().element, identifier)));
+}
+
+std::string AssociationTest::pairWithoutElement(const std::string& computerName) {
+    return testsupport::toText(association(computerPath(computerName), classPath(side().element)));
+}
+
+ObjectPath AssociationTest::association(const ObjectPath& antecedent, const ObjectPath& dependent) {
+    ObjectPath path = classPath(side().association);
+    if (!antecedent.className.empty()) {
+        path.keys.push_back(testsupport::named("Antecedent", testsupport::reference(antecedent)));
+    }
+    if (!dependent.className.empty()) {
+        path.keys.push_back(testsupport::named("Dependent", testsupport::reference(dependent)));
+    }
+    return path;
+}
+
+}  // namespace contract

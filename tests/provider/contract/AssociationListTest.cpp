@@ -1,0 +1,180 @@
+#include "AssociationFixture.h"
+
+// Enumeration of an association class: pairs of a computer system and a record.
+
+namespace contract {
+namespace {
+
+using testing::ElementsAre;
+using testing::IsEmpty;
+using testsupport::textOf;
+
+class AssociationListTest : public AssociationTest {};
+
+INSTANTIATE_TEST_SUITE_P(Sides, AssociationListTest, testing::Values(leases, warranties), sideName);
+
+TEST_P(AssociationListTest, OneComputerIsPairedWithEachRecord) {
+    haveRecords({"A", "B", "C"});
+    knowComputers({"alpha"});
+    const Outcome outcome = names();
+    EXPECT_THAT(outcome, isOk(1));
+    EXPECT_THAT(textsOf(outcome.paths()), ElementsAre(pair("alpha", "A"), pair("alpha", "B"), pair("alpha", "C")));
+    EXPECT_EQ(outcome.events.size(), 4U) << "three paths and the end";
+}
+
+TEST_P(AssociationListTest, PathsHaveTheEndsAsTheirTwoKeys) {
+    haveRecords({"A"});
+    knowComputers({"alpha"});
+    const ObjectPath path = names().paths().at(0);
+    EXPECT_EQ(path.className, side().association);
+    EXPECT_EQ(path.nameSpace, nameSpace);
+    EXPECT_THAT(testsupport::namesOf(path.keys), ElementsAre("Antecedent", "Dependent"));
+    EXPECT_EQ(path.keys.at(0).value.type, CMPI_ref);
+    EXPECT_EQ(path.keys.at(1).value.type, CMPI_ref);
+}
+
+TEST_P(AssociationListTest, InstancesHaveThePathsKeysAsTheirOnlyProperties) {
+    haveRecords({"A", "B"});
+    knowComputers({"alpha"});
+    const auto paths = names().paths();
+    const Outcome outcome = instances();
+    EXPECT_THAT(outcome, isOk(1));
+    const auto found = outcome.instances();
+    ASSERT_EQ(found.size(), 2U);
+    for (std::size_t index = 0; index < found.size(); ++index) {
+        EXPECT_EQ(testsupport::toText(found[index].path), testsupport::toText(paths.at(index)));
+        EXPECT_EQ(shown(found[index].properties), shown(paths.at(index).keys));
+    }
+}
+
+TEST_P(AssociationListTest, NoRecordAndOneComputerMakeNoPair) {
+    knowComputers({"alpha"});
+    const Outcome outcome = names();
+    EXPECT_THAT(outcome, isOk(1));
+    EXPECT_THAT(outcome.paths(), IsEmpty());
+    EXPECT_THAT(loggedFailures(), IsEmpty());
+}
+
+TEST_P(AssociationListTest, NoRecordAndTwoComputersMakeOnePairWithoutElementKey) {
+    knowComputers({"alpha", "beta"});
+    EXPECT_THAT(textsOf(names().paths()), ElementsAre(pairWithoutElement("alpha")));
+    const Outcome outcome = instances();
+    EXPECT_THAT(outcome, isOk(1));
+    ASSERT_EQ(outcome.instances().size(), 1U);
+    const auto dependent = testsupport::referenceOf(outcome.instances()[0].properties, "Dependent");
+    ASSERT_TRUE(dependent.has_value());
+    EXPECT_EQ(testsupport::toText(*dependent), keylessElement());
+}
+
+TEST_P(AssociationListTest, OfTwoComputersTheFirstIsPairedWithAllRecords) {
+    haveRecords({"A", "B"});
+    knowComputers({"alpha", "beta"});
+    EXPECT_THAT(textsOf(names().paths()), ElementsAre(pair("alpha", "A"), pair("alpha", "B")));
+}
+
+TEST_P(AssociationListTest, AComputerBetweenTheFirstAndTheLastIsPairedWithNoRecord) {
+    haveRecords({"A", "B"});
+    knowComputers({"alpha", "beta", "gamma"});
+    EXPECT_THAT(textsOf(names().paths()),
+                ElementsAre(pair("alpha", "A"), pair("alpha", "B"), pairWithoutElement("beta")));
+}
+
+TEST_P(AssociationListTest, NoRecordAndThreeComputersMakeTwoPairsWithoutElementKey) {
+    knowComputers({"alpha", "beta", "gamma"});
+    EXPECT_THAT(textsOf(names().paths()), ElementsAre(pairWithoutElement("alpha"), pairWithoutElement("beta")));
+}
+
+TEST_P(AssociationListTest, ComputersOfTheObjectManagerNeedNotBeTheAgents) {
+    haveRecords({"A"});
+    knowComputers({"unheard of"});
+    EXPECT_THAT(textsOf(names().paths()), ElementsAre(pair("unheard of", "A")));
+}
+
+TEST_P(AssociationListTest, DeletedRecordsAreInNoPair) {
+    haveRecords({"A", "B", "C"});
+    knowComputers({"alpha"});
+    ASSERT_THAT(provider().deleteInstance(keyedPath(side().element, "B")), isOk(0));
+    EXPECT_THAT(textsOf(names().paths()), ElementsAre(pair("alpha", "A"), pair("alpha", "C")));
+}
+
+TEST_P(AssociationListTest, RecordsOfTheOtherClassAreInNoPair) {
+    const Side& other = std::string(side().element) == leases.element ? warranties : leases;
+    writeData(other.dataFile, recordFile(other, {"X"}));
+    haveRecords({"A"});
+    knowComputers({"alpha"});
+    EXPECT_THAT(textsOf(names().paths()), ElementsAre(pair("alpha", "A")));
+}
+
+TEST_P(AssociationListTest, ComputersAreAskedForByClassInTheRequestsNamespace) {
+    haveRecords({"A"});
+    knowComputers({"alpha"});
+    const Outcome outcome =
+        provider().enumerateInstanceNames(testsupport::objectPath("root/other", side().association));
+    const auto calls = broker.calls("CMPIBrokerFT.enumerateInstances");
+    ASSERT_EQ(calls.size(), 1U);
+    EXPECT_THAT(calls[0].arguments, ElementsAre("root/other:VELKO_ComputerSystem", "null"));
+    ASSERT_EQ(outcome.paths().size(), 1U);
+    EXPECT_EQ(outcome.paths()[0].nameSpace, "root/other");
+    const auto dependent = testsupport::referenceOf(outcome.paths()[0].keys, "Dependent");
+    ASSERT_TRUE(dependent.has_value());
+    EXPECT_EQ(dependent->nameSpace, "root/other");
+}
+
+TEST_P(AssociationListTest, KeysOfTheRequestsPathNarrowNothing) {
+    haveRecords({"A", "B"});
+    knowComputers({"alpha"});
+    const ObjectPath keyed = association(computerPath("alpha"), keyedPath(side().element, "B"));
+    EXPECT_THAT(textsOf(provider().enumerateInstanceNames(keyed).paths()),
+                ElementsAre(pair("alpha", "A"), pair("alpha", "B")));
+}
+
+TEST_P(AssociationListTest, ThePropertyListIsNotApplied) {
+    haveRecords({"A"});
+    knowComputers({"alpha"});
+    const auto all = textsOf(instances().instances());
+    const Outcome narrowed =
+        provider().enumerateInstances(classPath(side().association), std::vector<std::string>{"Dependent"});
+    EXPECT_EQ(textsOf(narrowed.instances()), all);
+}
+
+TEST_P(AssociationListTest, LetterCaseOfTheClassNameDoesNotCount) {
+    haveRecords({"A"});
+    knowComputers({"alpha"});
+    std::string lowered = side().association;
+    for (char& character : lowered) {
+        character = static_cast<char>(std::tolower(static_cast<unsigned char>(character)));
+    }
+    EXPECT_THAT(textsOf(provider().enumerateInstanceNames(classPath(lowered)).paths()),
+                ElementsAre(pair("alpha", "A")));
+}
+
+TEST_P(AssociationListTest, NothingIsChangedByIt) {
+    haveRecords({"A"});
+    knowComputers({"alpha"});
+    const auto before = readData(side().dataFile);
+    names();
+    instances();
+    EXPECT_EQ(readData(side().dataFile), before);
+}
+
+TEST_P(AssociationListTest, AssociationsCannotBeGot) {
+    haveRecords({"A"});
+    knowComputers({"alpha"});
+    const ObjectPath existing = names().paths().at(0);
+    EXPECT_THAT(provider().getInstance(existing), isRefused(CMPI_RC_ERR_NOT_SUPPORTED));
+    EXPECT_EQ(upCalls(), 1) << "the enumeration's alone";
+}
+
+TEST_P(AssociationListTest, AssociationsCannotBeCreatedModifiedOrDeleted) {
+    haveRecords({"A"});
+    knowComputers({"alpha"});
+    const ObjectPath path = names().paths().at(0);
+    const Instance instance = clientInstance(path, path.keys);
+    EXPECT_THAT(provider().createInstance(path, instance), isRefused(CMPI_RC_ERR_INVALID_CLASS));
+    EXPECT_THAT(provider().modifyInstance(path, instance), isRefused(CMPI_RC_ERR_INVALID_CLASS));
+    EXPECT_THAT(provider().deleteInstance(path), isRefused(CMPI_RC_ERR_INVALID_CLASS));
+    EXPECT_THAT(textsOf(names().paths()), ElementsAre(pair("alpha", "A")));
+}
+
+}  // namespace
+}  // namespace contract
