@@ -42,6 +42,12 @@ std::string thrown(Operation operation) {
     return {};
 }
 
+/** Whether a cursor stands on something. Its own operator may move it, which a test assertion forbids. */
+template <class Cursor>
+bool stands(Cursor& cursor) {
+    return cursor;
+}
+
 /** A trace text with its line numbers as N, which tests do not depend on. */
 inline std::string withoutLine(const std::string& text) {
     static const std::regex number("(\\[Line: |, Line: |at line )[0-9]+");

@@ -1,0 +1,162 @@
+// What only the lease file has: four flags, and its thirteen lines in their order.
+
+#include "Sides.h"
+
+namespace {
+
+using namespace providerTest;
+
+using LeaseFile = RecordStore<LeaseSide>;
+
+TEST_F(LeaseFile, StartsARecordWithFlagsClearedNumbersZeroAndTextsEmpty) {
+    const LeaseUnit expected = [] {
+        LeaseUnit unit;
+        unit.inUse = true;
+        unit.EarlyTerminationOption = unit.FixedPricePurchaseOption = unit.RenewalOption = unit.BargainRenewalOption =
+            false;
+        unit.LeaseTerm = unit.NetMonthlyLeaseRateFactor = 0;
+        unit.InstanceID = unit.Lessor = unit.BaseRent = unit.BaseTermCommencementDate = "";
+        unit.FairMarketRental = unit.FairMarketValue = unit.TerminationValue = "";
+        return unit;
+    }();
+    const LeaseUnit defaults;
+    EXPECT_EQ(LeaseSide::members(defaults), LeaseSide::members(expected));
+    LeaseUnit named("lease 1");
+    EXPECT_EQ(named.InstanceID, "lease 1");
+    named.InstanceID = "";
+    EXPECT_EQ(LeaseSide::members(named), LeaseSide::members(expected));
+}
+
+TEST_F(LeaseFile, HoldsThirteenLinesInFileOrder) {
+    LeaseUnit unit("lease 1");
+    unit.Lessor = "ACME Leasing Co";
+    unit.BaseTermCommencementDate = "20240101000000.000000+060";
+    unit.LeaseTerm = 36;
+    unit.EarlyTerminationOption = true;
+    unit.RenewalOption = true;
+    unit.BaseRent = "100.50 EUR";
+    unit.FairMarketRental = "91";
+    unit.FairMarketValue = "82";
+    unit.TerminationValue = "73";
+    unit.NetMonthlyLeaseRateFactor = 5;
+    EXPECT_EQ(written(unit),
+              "lease_1\n"
+              "ACME_Leasing_Co\n"
+              "20240101000000.000000+060\n"
+              "36\n"
+              "1\n"
+              "0\n"
+              "1\n"
+              "0\n"
+              "100.50_EUR\n"
+              "91\n"
+              "82\n"
+              "73\n"
+              "5\n");
+    EXPECT_EQ(LeaseSide::members(reread(unit)), LeaseSide::members(unit));
+}
+
+TEST_F(LeaseFile, HoldsEachFlagAsOneOrZero) {
+    constexpr std::pair<bool LeaseUnit::*, std::size_t> flags[] = {{&LeaseUnit::EarlyTerminationOption, 4},
+                                                                   {&LeaseUnit::FixedPricePurchaseOption, 5},
+                                                                   {&LeaseUnit::RenewalOption, 6},
+                                                                   {&LeaseUnit::BargainRenewalOption, 7}};
+    for (const auto& [member, line] : flags) {
+        LeaseUnit unit("A");
+        unit.*member = true;
+        std::vector<std::string> expected = linesOf(std::string("A\n") + LeaseSide::defaultRecord);
+        expected[line] = "1";
+        EXPECT_EQ(linesOf(written(unit)), expected);
+        EXPECT_TRUE(reread(unit).*member);
+    }
+}
+
+/** Two records, of which the first has something else in one line. */
+std::string damaged(std::size_t line, const std::string& text) {
+    std::vector<std::string> lines = {
+        "A", "Ay", "20240101000000.000000+000", "1", "1", "1", "1", "1", "11", "12", "13", "14", "2"};
+    lines[line] = text;
+    std::string content = "2\n";
+    for (const std::string& each : lines) {
+        content += each + "\n";
+    }
+    return content + "B\nBee\n20250101000000.000000+000\n3\n0\n0\n0\n0\n21\n22\n23\n24\n4\n";
+}
+
+void expectStopped(const LeaseCache& cache, unsigned int leaseTerm, bool firstFlags) {
+    ASSERT_EQ(cache.recordCountLease, 2U);
+    ASSERT_EQ(cache.table.size(), 2U);
+    const LeaseUnit& first = cache.table[0];
+    EXPECT_EQ(first.InstanceID, "A");
+    EXPECT_EQ(first.Lessor, "Ay");
+    EXPECT_EQ(first.BaseTermCommencementDate, "20240101000000.000000+000");
+    EXPECT_EQ(first.LeaseTerm, leaseTerm);
+    EXPECT_EQ(first.EarlyTerminationOption, firstFlags);
+    EXPECT_EQ(first.FixedPricePurchaseOption, firstFlags);
+    EXPECT_FALSE(first.RenewalOption);
+    EXPECT_FALSE(first.BargainRenewalOption);
+    EXPECT_EQ(first.BaseRent, "");
+    EXPECT_EQ(first.NetMonthlyLeaseRateFactor, 0U);
+    EXPECT_EQ(LeaseSide::members(cache.table[1]), LeaseSide::members(first));
+}
+
+TEST_F(LeaseFile, StopsReadingAtAWordInAFlagLine) {
+    for (const char* text : {"true", "x", "2", "-1", "*"}) {
+        SCOPED_TRACE(text);
+        expectStopped(*load(damaged(6, text)), 1, true);
+    }
+}
+
+TEST_F(LeaseFile, StopsReadingAtWhatIsNoUnsignedNumber) {
+    for (const char* text : {"x", "-5", "+5", "-0", "4294967296", ".5", "*"}) {
+        SCOPED_TRACE(text);
+        expectStopped(*load(damaged(3, text)), 0, false);
+    }
+}
+
+TEST_F(LeaseFile, ReadsTheDigitsAtTheHeadOfANumberLineAndShiftsByTheRest) {
+    const auto cache = load(damaged(3, "12x"));
+    EXPECT_EQ(cache->table[0].LeaseTerm, 12U);
+    EXPECT_FALSE(cache->table[0].EarlyTerminationOption);
+}
+
+TEST_F(LeaseFile, KeepsTheValuesOfTheRecordBeforeWhereReadingStopped) {
+    std::string content = damaged(12, "2");
+    content.replace(content.find("\n23\n"), 4, "\n");  // one line less: the last number finds the file's end
+    const auto cache = load(content);
+    const LeaseUnit& second = cache->table.at(1);
+    EXPECT_EQ(second.InstanceID, "B");
+    EXPECT_EQ(second.FairMarketValue, "24");
+    EXPECT_EQ(second.TerminationValue, "4");
+    EXPECT_EQ(second.NetMonthlyLeaseRateFactor, 2U);
+}
+
+TEST_F(LeaseFile, IsReadAndWrittenByteForByte) {
+    const std::string content = contentOf(std::filesystem::path(PROVIDER_TEST_DATA) / "Lease.dat");
+    ASSERT_FALSE(content.empty());
+    const auto cache = load(content);
+    ASSERT_EQ(cache->table.size(), 3U);
+    const LeaseUnit& full = cache->table[0];
+    EXPECT_EQ(full.InstanceID, "/system/computer");
+    EXPECT_EQ(full.Lessor, "ACME Leasing Co");
+    EXPECT_EQ(full.BaseTermCommencementDate, "20240229123000.000000+060");
+    EXPECT_EQ(full.LeaseTerm, 36U);
+    EXPECT_TRUE(full.EarlyTerminationOption);
+    EXPECT_FALSE(full.FixedPricePurchaseOption);
+    EXPECT_TRUE(full.RenewalOption);
+    EXPECT_FALSE(full.BargainRenewalOption);
+    EXPECT_EQ(full.BaseRent, "1 250.00 EUR");
+    EXPECT_EQ(full.FairMarketRental, "1100");
+    EXPECT_EQ(full.FairMarketValue, "45 000");
+    EXPECT_EQ(full.TerminationValue, "");
+    EXPECT_EQ(full.NetMonthlyLeaseRateFactor, 4294967295U);
+    EXPECT_EQ(cache->table[1].InstanceID, "lease 2");
+    EXPECT_EQ(cache->table[1].Lessor, "");
+    EXPECT_EQ(cache->table[2].Lessor, "M\xC3\xBCller & S\xC3\xB6hne");
+    EXPECT_TRUE(cache->table[2].BargainRenewalOption);
+    std::filesystem::remove(path());
+    cache->flushCache();
+    EXPECT_EQ(file(), content);
+}
+
+}  // namespace

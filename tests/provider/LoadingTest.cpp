@@ -1,0 +1,225 @@
+// Loading a record file of whatever content. It never fails.
+
+#include "Sides.h"
+
+#include <gmock/gmock.h>
+
+#include <locale>
+
+namespace {
+
+using namespace providerTest;
+using testing::ElementsAre;
+
+template <class Side>
+class Loading : public RecordStore<Side> {
+protected:
+    using Cache = typename Side::Cache;
+
+    static std::string record(const std::string& identifier) { return identifier + "\n" + Side::defaultRecord; }
+
+    static void expectEmpty(Cache& cache) {
+        EXPECT_EQ(Side::count(cache), 0U);
+        EXPECT_TRUE(cache.table.empty());
+    }
+
+    static std::vector<std::string> identifiers(Cache& cache) {
+        EXPECT_EQ(Side::count(cache), cache.table.size());
+        std::vector<std::string> found;
+        for (const auto& unit : cache.table) {
+            EXPECT_TRUE(unit.inUse);
+            found.push_back(unit.InstanceID);
+        }
+        return found;
+    }
+};
+
+TYPED_TEST_SUITE(Loading, Sides, SideNames);
+
+TYPED_TEST(Loading, OfAnAbsentFileGivesAnEmptyTableAndMakesNoFile) {
+    typename TypeParam::Cache cache;
+    this->expectEmpty(cache);
+    EXPECT_FALSE(std::filesystem::exists(this->path()));
+}
+
+TYPED_TEST(Loading, OfAFileThatCountsZeroIsTheSameAsOfNone) {
+    for (const char* content : {"0\n", "0", "0\nA\nB\n", "  \n\n0\n"}) {
+        this->expectEmpty(*this->load(content));
+    }
+}
+
+TYPED_TEST(Loading, OfAnEmptyFileGivesAnEmptyTable) {
+    for (const char* content : {"", "\n", " \t\n\n"}) {
+        this->expectEmpty(*this->load(content));
+    }
+}
+
+TYPED_TEST(Loading, GivesTheRecordsInFileOrder) {
+    const auto cache = this->load("3\n" + this->record("C") + this->record("A") + this->record("B"));
+    EXPECT_THAT(this->identifiers(*cache), ElementsAre("C", "A", "B"));
+}
+
+TYPED_TEST(Loading, MakesRoomForTenRecordsAndForTwiceAsManyAsAreCounted) {
+    EXPECT_GE(this->load("0\n")->table.capacity(), 10U);
+    EXPECT_GE(this->load("11\n")->table.capacity(), 22U);
+}
+
+TYPED_TEST(Loading, GivesManyRecords) {
+    std::string content = "25\n";
+    std::vector<std::string> expected;
+    for (int number = 0; number < 25; ++number) {
+        expected.push_back("R" + std::to_string(number));
+        content += this->record(expected.back());
+    }
+    EXPECT_EQ(this->identifiers(*this->load(content)), expected);
+}
+
+TYPED_TEST(Loading, IgnoresRecordsBeyondTheCount) {
+    const auto cache = this->load("1\n" + this->record("A") + this->record("B"));
+    EXPECT_THAT(this->identifiers(*cache), ElementsAre("A"));
+}
+
+TYPED_TEST(Loading, GivesTheDeclaredNumberOfRecordsForAShorterFile) {
+    const auto cache = this->load("4\n" + this->record("A") + this->record("B"));
+    EXPECT_THAT(this->identifiers(*cache), ElementsAre("A", "B", "B", "B"));
+    EXPECT_EQ(TypeParam::members(cache->table[3]), TypeParam::members(cache->table[1]));
+}
+
+TYPED_TEST(Loading, GivesTheDeclaredNumberOfDefaultRecordsForACountAlone) {
+    const auto cache = this->load("2\n");
+    EXPECT_THAT(this->identifiers(*cache), ElementsAre("", ""));
+    const typename TypeParam::Unit defaults;
+    EXPECT_EQ(TypeParam::members(cache->table[0]), TypeParam::members(defaults));
+}
+
+TYPED_TEST(Loading, KeepsTheValuesOfTheRecordBeforeForMissingFields) {
+    const std::string date = "20240101000000.000000+000";
+    const bool isLease = TypeParam::linesOfRecord == 13;
+    const std::string rest = isLease ? "1\n1\n1\n1\n11\n12\n13\n14\n2\n" : "";
+    const auto cache = this->load("2\nA\nAy_Co\n" + date + "\n36\n" + rest + "B\nBee");
+    auto expected = cache->table.at(0);
+    EXPECT_EQ(expected.InstanceID, "A");
+    EXPECT_EQ(expected.*TypeParam::numberMember, 36U);
+    expected.InstanceID = "B";
+    expected.*TypeParam::textMember = "Bee";
+    EXPECT_EQ(TypeParam::members(cache->table.at(1)), TypeParam::members(expected));
+}
+
+TYPED_TEST(Loading, TakesTheLastRecordWithoutItsLineFeed) {
+    std::string content = "1\n" + this->record("A");
+    content.pop_back();
+    EXPECT_THAT(this->identifiers(*this->load(content)), ElementsAre("A"));
+}
+
+TYPED_TEST(Loading, TakesCarriageReturnsAsWhiteSpace) {
+    std::string content;
+    for (const std::string& line : linesOf("2\n" + this->record("A_1") + this->record("B"))) {
+        content += line + "\r\n";
+    }
+    const auto cache = this->load(content);
+    EXPECT_THAT(this->identifiers(*cache), ElementsAre("A 1", "B"));
+    EXPECT_EQ(cache->table[0].*TypeParam::date().member, "00000000000000.000000-000");
+}
+
+TYPED_TEST(Loading, TakesAnyWhiteSpaceBetweenFields) {
+    const auto cache = this->load("\t1 \v A\f Ay_Co\n\n 20240101000000.000000+000 7");
+    EXPECT_THAT(this->identifiers(*cache), ElementsAre("A"));
+    EXPECT_EQ(cache->table[0].*TypeParam::numberMember, 7U);
+}
+
+TYPED_TEST(Loading, TakesACountWithLeadingZerosAsDecimal) {
+    EXPECT_EQ(this->identifiers(*this->load("012\n")).size(), 12U);
+}
+
+TYPED_TEST(Loading, OfACountThatIsNoUnsignedNumberGivesAnEmptyTable) {
+    for (const char* count :
+         {"-1", "+5", "-0", "x", "true", "*", "4294967296", "99999999999999999999999", "0x10", ".5"}) {
+        SCOPED_TRACE(count);
+        this->expectEmpty(*this->load(count + std::string("\n") + this->record("A")));
+    }
+}
+
+TYPED_TEST(Loading, OfACountThatMemoryCannotHoldGivesAnEmptyTable) {
+    for (const char* count : {"4294967295", "2147483648", "2147483649", "3000000000"}) {
+        SCOPED_TRACE(count);
+        this->expectEmpty(*this->load(count + std::string("\n") + this->record("A")));
+    }
+}
+
+TYPED_TEST(Loading, OfADirectoryGivesAnEmptyTable) {
+    blockWithDirectory(this->path());
+    typename TypeParam::Cache cache;
+    this->expectEmpty(cache);
+}
+
+TYPED_TEST(Loading, OfAFileThatCannotBeOpenedGivesAnEmptyTable) {
+    std::filesystem::create_symlink(this->path(), this->path());
+    typename TypeParam::Cache cache;
+    this->expectEmpty(cache);
+}
+
+TYPED_TEST(Loading, WithoutADataDirectoryGivesAnEmptyTable) {
+    std::filesystem::remove_all(agentEnvironment::dataDirectory());
+    typename TypeParam::Cache cache;
+    this->expectEmpty(cache);
+}
+
+/** Bytes without rule, the same for the same seed. */
+std::string rubbish(unsigned int seed, std::size_t length) {
+    std::string bytes;
+    while (bytes.size() < length) {
+        seed = seed * 1664525U + 1013904223U;
+        bytes += static_cast<char>(seed >> 24U);
+    }
+    return bytes;
+}
+
+TYPED_TEST(Loading, SurvivesRubbish) {
+    for (unsigned int seed = 1; seed <= 20; ++seed) {
+        SCOPED_TRACE(seed);
+        const auto bare = this->load(rubbish(seed, 2000));
+        EXPECT_EQ(TypeParam::count(*bare), bare->table.size());
+        const auto counted = this->load("7\n" + rubbish(seed, 2000));
+        EXPECT_EQ(this->identifiers(*counted).size(), 7U);
+        counted->flushCache();
+        EXPECT_EQ(this->file().substr(0, 2), "7\n");
+    }
+}
+
+TYPED_TEST(Loading, SurvivesAVeryLongLine) {
+    const std::string longName(1U << 20U, 'n');
+    EXPECT_THAT(this->identifiers(*this->load("1\n" + this->record(longName))), ElementsAre(longName));
+}
+
+/** Groups digits, as the locale of a process may. */
+struct Grouping : std::numpunct<char> {
+    char do_thousands_sep() const override { return '.'; }
+    std::string do_grouping() const override { return "\3"; }
+};
+
+class GlobalLocale {
+public:
+    explicit GlobalLocale(const std::locale& locale) : before(std::locale::global(locale)) {}
+    ~GlobalLocale() { std::locale::global(before); }
+    GlobalLocale(const GlobalLocale&) = delete;
+    GlobalLocale& operator=(const GlobalLocale&) = delete;
+
+private:
+    std::locale before;
+};
+
+TYPED_TEST(Loading, AndWritingKeepOutOfTheLocaleOfTheProcess) {
+    const GlobalLocale grouping(std::locale(std::locale::classic(), new Grouping));
+    typename TypeParam::Unit unit("A");
+    unit.*TypeParam::numberMember = 1234567;
+    EXPECT_THAT(linesOf(this->written(unit)), testing::Contains("1234567"));
+    EXPECT_EQ(this->reread(unit).*TypeParam::numberMember, 1234567U);
+}
+
+TYPED_TEST(Loading, LeavesTheFileAloneAndSoDoesReleasingTheTable) {
+    const std::string content = "2\n" + this->record("A") + "short";
+    this->load(content)->table.clear();
+    EXPECT_EQ(this->file(), content);
+}
+
+}  // namespace

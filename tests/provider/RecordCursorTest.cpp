@@ -1,0 +1,209 @@
+// Where a cursor over the records stands, and how it moves.
+
+#include "Sides.h"
+
+#include <gmock/gmock.h>
+
+namespace {
+
+using namespace providerTest;
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+template <class Side>
+class RecordCursor : public RecordStore<Side> {
+protected:
+    /** The identifiers from the current record on, in the order of the walk. */
+    static std::vector<std::string> walked(typename Side::Base& base) {
+        std::vector<std::string> identifiers;
+        for (; base; ++base) {
+            identifiers.push_back(RecordStore<Side>::identifier(base));
+        }
+        return identifiers;
+    }
+};
+
+TYPED_TEST_SUITE(RecordCursor, Sides, SideNames);
+
+TYPED_TEST(RecordCursor, StandsAtTheEndOfAnEmptyTable) {
+    typename TypeParam::Base base;
+    EXPECT_FALSE(stands(base));
+    EXPECT_TRUE(this->atEnd(base));
+}
+
+TYPED_TEST(RecordCursor, StandsOnTheFirstRecordInUse) {
+    this->fill({"A", "B", "C"});
+    this->markDeleted(0);
+    typename TypeParam::Base base;
+    EXPECT_EQ(this->identifier(base), "B");
+    EXPECT_TRUE(stands(base));
+}
+
+TYPED_TEST(RecordCursor, StandsAtTheEndWhenNoRecordIsCounted) {
+    this->fill({"A"});
+    this->count() = 0;
+    typename TypeParam::Base base;
+    EXPECT_TRUE(this->atEnd(base));
+    EXPECT_FALSE(stands(base));
+}
+
+TYPED_TEST(RecordCursor, CannotBeMadeWhenRecordsAreCountedAndThereAreNone) {
+    this->count() = 1;
+    EXPECT_EQ(thrown<InstrumentationException>([] { typename TypeParam::Base base; }), Words<TypeParam>::noRecords);
+}
+
+TYPED_TEST(RecordCursor, CannotBeMadeWhenRecordsAreCountedAndAllAreDeleted) {
+    this->fill({"A", "B"});
+    this->markDeleted(0);
+    this->markDeleted(1);
+    this->count() = 2;
+    agentEnvironment::forgetLog();
+    EXPECT_EQ(thrown<InstrumentationException>([] { typename TypeParam::Base base; }), Words<TypeParam>::noRecords);
+    const std::string function = std::string(TypeParam::name) + "Base";
+    const auto records = recordsOf(Words<TypeParam>::sourceFile, function);
+    ASSERT_FALSE(records.empty());
+    EXPECT_EQ(withoutLine(records.back().text), message(Words<TypeParam>::noRecords, Words<TypeParam>::sourceFile));
+    EXPECT_EQ(records.back().level, 3000);
+}
+
+TYPED_TEST(RecordCursor, VisitsTheRecordsInUseInTableOrder) {
+    this->fill({"C", "A", "x", "B", "y"});
+    this->markDeleted(2);
+    this->markDeleted(4);
+    typename TypeParam::Base base;
+    EXPECT_THAT(this->walked(base), ElementsAre("C", "A", "B"));
+}
+
+TYPED_TEST(RecordCursor, StaysAtTheEnd) {
+    this->fill({"A"});
+    typename TypeParam::Base base;
+    ++base;
+    EXPECT_FALSE(stands(base));
+    ++base;
+    ++base;
+    EXPECT_FALSE(stands(base));
+    EXPECT_TRUE(this->atEnd(base));
+}
+
+TYPED_TEST(RecordCursor, DoesNotReturnFromTheEndWhenARecordIsAppended) {
+    this->fill({"A"});
+    typename TypeParam::Base base;
+    ++base;
+    this->fill({"B"});
+    EXPECT_FALSE(stands(base));
+}
+
+TYPED_TEST(RecordCursor, MovesOffADeletedRecordWhenAskedWhetherItStandsOnOne) {
+    this->fill({"A", "B", "C"});
+    typename TypeParam::Base base;
+    this->markDeleted(0);
+    this->markDeleted(1);
+    EXPECT_EQ(this->identifier(base), "A");
+    EXPECT_TRUE(stands(base));
+    EXPECT_EQ(this->identifier(base), "C");
+}
+
+TYPED_TEST(RecordCursor, MovesToTheEndWhenOnlyDeletedRecordsFollow) {
+    this->fill({"A", "B"});
+    typename TypeParam::Base base;
+    this->markDeleted(0);
+    this->markDeleted(1);
+    EXPECT_FALSE(this->atEnd(base));
+    EXPECT_FALSE(stands(base));
+    EXPECT_TRUE(this->atEnd(base));
+}
+
+TYPED_TEST(RecordCursor, SelectsARecordByItsIdentifier) {
+    this->fill({"A", "B", "C"});
+    typename TypeParam::Base base;
+    TypeParam::select(base, "B");
+    EXPECT_EQ(this->identifier(base), "B");
+    EXPECT_THAT(this->walked(base), ElementsAre("B", "C"));
+}
+
+TYPED_TEST(RecordCursor, SelectsTheRecordItStandsOn) {
+    this->fill({"A", "B"});
+    typename TypeParam::Base base;
+    ++base;
+    TypeParam::select(base, "B");
+    EXPECT_EQ(this->identifier(base), "B");
+    TypeParam::select(base, "B");
+    EXPECT_EQ(this->identifier(base), "B");
+}
+
+TYPED_TEST(RecordCursor, SelectsForwardOnly) {
+    this->fill({"A", "B", "C"});
+    typename TypeParam::Base base;
+    TypeParam::select(base, "C");
+    TypeParam::select(base, "B");
+    EXPECT_FALSE(stands(base));
+    typename TypeParam::Base fresh;
+    TypeParam::select(fresh, "B");
+    EXPECT_EQ(this->identifier(fresh), "B");
+}
+
+TYPED_TEST(RecordCursor, SelectsByteForByte) {
+    this->fill({"Lease 1", "lease 10", "lease", std::string("lease 1\0x", 9), " lease 1", "lease 1", "lease 1 "});
+    typename TypeParam::Base base;
+    TypeParam::select(base, "lease 1");
+    EXPECT_THAT(this->walked(base), ElementsAre("lease 1", "lease 1 "));
+}
+
+TYPED_TEST(RecordCursor, EndsAtTheEndWhenNoRecordHasTheIdentifier) {
+    this->fill({"A", "B"});
+    for (const char* identifier : {"a", "", "AB", "C"}) {
+        typename TypeParam::Base base;
+        TypeParam::select(base, identifier);
+        EXPECT_TRUE(this->atEnd(base)) << identifier;
+    }
+}
+
+TYPED_TEST(RecordCursor, SelectsNoDeletedRecord) {
+    this->fill({"A", "B", "B"});
+    this->markDeleted(1);
+    typename TypeParam::Base base;
+    TypeParam::select(base, "B");
+    EXPECT_EQ(this->identifier(base), "B");
+    ++base;
+    EXPECT_FALSE(stands(base));
+    this->markDeleted(2);
+    typename TypeParam::Base second;
+    TypeParam::select(second, "B");
+    EXPECT_TRUE(this->atEnd(second));
+}
+
+TYPED_TEST(RecordCursor, SelectingAtTheEndStaysThere) {
+    this->fill({"A"});
+    typename TypeParam::Base base;
+    ++base;
+    TypeParam::select(base, "A");
+    EXPECT_TRUE(this->atEnd(base));
+}
+
+TYPED_TEST(RecordCursor, IsNotDisturbedByRecordsThatAnotherAppends) {
+    this->fill({"A", "B"});
+    typename TypeParam::Base base;
+    ++base;
+    {
+        typename TypeParam::Base other;
+        for (int number = 0; number < 100; ++number) {
+            TypeParam::create(other, "N" + std::to_string(number));
+        }
+    }
+    EXPECT_EQ(this->identifier(base), "B");
+    EXPECT_EQ(this->walked(base).size(), 101U);
+}
+
+TYPED_TEST(RecordCursor, SeesChangesOfAnotherAtOnce) {
+    this->fill({"A"});
+    typename TypeParam::Base first;
+    typename TypeParam::Base second;
+    first.setProperty(TypeParam::text, std::string("changed"));
+    std::string text;
+    second.getProperty(TypeParam::text, text);
+    EXPECT_EQ(text, "changed");
+    TypeParam::remove(second);
+    EXPECT_FALSE(stands(first));
+}
+
+}  // namespace

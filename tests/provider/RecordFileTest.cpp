@@ -1,0 +1,204 @@
+// One record in the file, and back.
+
+#include "Sides.h"
+
+#include <gmock/gmock.h>
+
+namespace {
+
+using namespace providerTest;
+
+template <class Side>
+class RecordFile : public RecordStore<Side> {
+protected:
+    using Unit = typename Side::Unit;
+
+    static std::string line(const Unit& unit, std::size_t index) {
+        return linesOf(RecordStore<Side>::written(unit)).at(index);
+    }
+};
+
+TYPED_TEST_SUITE(RecordFile, Sides, SideNames);
+
+TYPED_TEST(RecordFile, HoldsDefaultsForANewRecord) {
+    EXPECT_EQ(this->written(typename TypeParam::Unit("A")), std::string("A\n") + TypeParam::defaultRecord);
+}
+
+TYPED_TEST(RecordFile, HoldsAsManyLinesForEveryRecordAsItHasFields) {
+    typename TypeParam::Unit unit;
+    EXPECT_EQ(linesOf(this->written(unit)).size(), TypeParam::linesOfRecord);
+    for (const auto& value : TypeParam::values()) {
+        unit.*value.member = "some text";
+    }
+    EXPECT_EQ(linesOf(this->written(unit)).size(), TypeParam::linesOfRecord);
+}
+
+TYPED_TEST(RecordFile, HoldsBlanksAsUnderscoresAndGivesThemBack) {
+    for (const auto& value : TypeParam::values()) {
+        typename TypeParam::Unit unit("A");
+        unit.*value.member = "ACME Leasing  Co";
+        EXPECT_EQ(this->line(unit, value.line), "ACME_Leasing__Co");
+        EXPECT_EQ(this->reread(unit).*value.member, "ACME Leasing  Co");
+    }
+}
+
+TYPED_TEST(RecordFile, GivesUnderscoresBackAsBlanks) {
+    for (const auto& value : TypeParam::values()) {
+        typename TypeParam::Unit unit("A");
+        unit.*value.member = "ACME_Leasing Co";
+        EXPECT_EQ(this->line(unit, value.line), "ACME_Leasing_Co");
+        EXPECT_EQ(this->reread(unit).*value.member, "ACME Leasing Co");
+    }
+}
+
+TYPED_TEST(RecordFile, LosesValuesOfNoAndOfOneCharacter) {
+    for (const auto& value : TypeParam::values()) {
+        for (const char* text : {"", "X", "*", " ", "_", "7"}) {
+            typename TypeParam::Unit unit("A");
+            unit.*value.member = text;
+            EXPECT_EQ(this->line(unit, value.line), "*") << text;
+            EXPECT_EQ(this->reread(unit).*value.member, "") << text;
+        }
+    }
+}
+
+TYPED_TEST(RecordFile, KeepsValuesOfTwoCharacters) {
+    for (const auto& value : TypeParam::values()) {
+        for (const char* text : {"XY", "**", "*X", "\xC3\xBC"}) {
+            typename TypeParam::Unit unit("A");
+            unit.*value.member = text;
+            EXPECT_EQ(this->line(unit, value.line), text);
+            EXPECT_EQ(this->reread(unit).*value.member, text);
+        }
+    }
+}
+
+TYPED_TEST(RecordFile, HoldsTheBytesOfAnyEncoding) {
+    typename TypeParam::Unit unit("M\xFCller");
+    unit.*TypeParam::textMember = "M\xC3\xBCller \xFE\x80\x01";
+    EXPECT_EQ(this->line(unit, 0), "M\xFCller");
+    EXPECT_EQ(this->line(unit, 1), "M\xC3\xBCller_\xFE\x80\x01");
+    EXPECT_EQ(this->reread(unit).InstanceID, "M\xFCller");
+    EXPECT_EQ(this->reread(unit).*TypeParam::textMember, "M\xC3\xBCller \xFE\x80\x01");
+}
+
+TYPED_TEST(RecordFile, HoldsTheDefaultDateForADateTooShort) {
+    const std::string date24 = "20240101000000.000000+00";
+    for (const std::string& text : {std::string(), std::string("2024"), date24}) {
+        typename TypeParam::Unit unit("A");
+        unit.*TypeParam::date().member = text;
+        EXPECT_EQ(this->line(unit, TypeParam::date().line), "00000000000000.000000-000") << text;
+        EXPECT_EQ(this->reread(unit).*TypeParam::date().member, "00000000000000.000000-000") << text;
+    }
+}
+
+TYPED_TEST(RecordFile, KeepsADateOf25CharactersAndMoreAsItIs) {
+    for (const std::string& text : {std::string("20240101000000.000000+000"), std::string("20240101000000.000000+0000"),
+                                    std::string("no_date_but_long_enough_to_be_one"), std::string(300, '9')}) {
+        typename TypeParam::Unit unit("A");
+        unit.*TypeParam::date().member = text;
+        EXPECT_EQ(this->line(unit, TypeParam::date().line), text);
+        EXPECT_EQ(this->reread(unit).*TypeParam::date().member, text);
+    }
+}
+
+TYPED_TEST(RecordFile, LeavesTheBlanksOfADateUnescaped) {
+    typename TypeParam::Unit unit("A");
+    unit.*TypeParam::date().member = "20240101 000000 000000+000";
+    EXPECT_EQ(this->line(unit, TypeParam::date().line), "20240101 000000 000000+000");
+    EXPECT_EQ(this->reread(unit).*TypeParam::date().member, "20240101");
+}
+
+TYPED_TEST(RecordFile, HoldsBlanksOfAnIdentifierAsUnderscoresAndGivesThemBack) {
+    const typename TypeParam::Unit withBlank("lease 1");
+    EXPECT_EQ(this->line(withBlank, 0), "lease_1");
+    EXPECT_EQ(this->reread(withBlank).InstanceID, "lease 1");
+    const typename TypeParam::Unit withUnderscore("lease_1");
+    EXPECT_EQ(this->line(withUnderscore, 0), "lease_1");
+    EXPECT_EQ(this->reread(withUnderscore).InstanceID, "lease 1");
+}
+
+TYPED_TEST(RecordFile, KeepsIdentifiersOfOneCharacter) {
+    for (const char* text : {"L", "*", "0"}) {
+        const typename TypeParam::Unit unit(text);
+        EXPECT_EQ(this->line(unit, 0), text);
+        EXPECT_EQ(this->reread(unit).InstanceID, text);
+    }
+}
+
+TYPED_TEST(RecordFile, HoldsAnEmptyIdentifierAsAnEmptyLine) {
+    EXPECT_EQ(this->written(typename TypeParam::Unit("")), std::string("\n") + TypeParam::defaultRecord);
+}
+
+TYPED_TEST(RecordFile, ShiftsTheFieldsBehindAnEmptyIdentifierOnReading) {
+    typename TypeParam::Unit unit("");
+    unit.*TypeParam::textMember = "ACME Co";
+    unit.*TypeParam::date().member = "20240101000000.000000+000";
+    unit.*TypeParam::numberMember = 36;
+    const auto read = this->reread(unit);
+    EXPECT_EQ(read.InstanceID, "ACME Co");
+    EXPECT_EQ(read.*TypeParam::textMember, "20240101000000.000000+000");
+    EXPECT_EQ(read.*TypeParam::date().member, "36");
+}
+
+TYPED_TEST(RecordFile, HoldsNumbersAsUnsignedDecimalsWithoutPadding) {
+    for (const auto& number : TypeParam::numbers()) {
+        for (const auto& [value, text] : {std::pair(0U, "0"), std::pair(7U, "7"), std::pair(1234567U, "1234567"),
+                                          std::pair(2147483648U, "2147483648"), std::pair(4294967295U, "4294967295")}) {
+            typename TypeParam::Unit unit("A");
+            unit.*number.member = value;
+            EXPECT_EQ(this->line(unit, number.line), text);
+            EXPECT_EQ(this->reread(unit).*number.member, value);
+        }
+    }
+}
+
+TYPED_TEST(RecordFile, ReadsEveryRecordAsOneInUse) {
+    typename TypeParam::Unit unit("A");
+    EXPECT_TRUE(this->reread(unit).inUse);
+}
+
+TYPED_TEST(RecordFile, ReadsARecordFromWhereTheStreamStands) {
+    const std::string record = std::string("A_1\n") + TypeParam::defaultRecord;
+    write(this->path(), "first line\n" + record + "next");
+    std::ifstream stream(this->path());
+    std::string firstLine;
+    std::getline(stream, firstLine);
+    typename TypeParam::Unit unit("before");
+    EXPECT_EQ(&(stream >> unit), &stream);
+    EXPECT_EQ(unit.InstanceID, "A 1");
+    std::string next;
+    stream >> next;
+    EXPECT_EQ(next, "next");
+}
+
+TYPED_TEST(RecordFile, KeepsInUseOfTheRecordReadInto) {
+    write(this->path(), std::string("A\n") + TypeParam::defaultRecord);
+    std::ifstream stream(this->path());
+    typename TypeParam::Unit unit;
+    unit.inUse = false;
+    stream >> unit;
+    EXPECT_EQ(unit.InstanceID, "A");
+    EXPECT_FALSE(unit.inUse);
+}
+
+TYPED_TEST(RecordFile, HandsEachWrittenLineToTheFileAtOnce) {
+    std::ofstream stream(this->path());
+    EXPECT_EQ(&(stream << typename TypeParam::Unit("A")), &stream);
+    EXPECT_EQ(this->file(), std::string("A\n") + TypeParam::defaultRecord);
+}
+
+TYPED_TEST(RecordFile, CopiesEveryField) {
+    const auto cache = this->load("1\nA\nACME_Co\n20240101000000.000000+000\n36\n1\n0\n1\n1\n100\n90\n80\n70\n5\n");
+    auto original = cache->table.at(0);
+    original.inUse = false;
+    const typename TypeParam::Unit copy(original);
+    EXPECT_EQ(TypeParam::members(copy), TypeParam::members(original));
+    typename TypeParam::Unit assigned("other");
+    assigned = original;
+    EXPECT_EQ(TypeParam::members(assigned), TypeParam::members(original));
+    const typename TypeParam::Unit fresh;
+    EXPECT_NE(TypeParam::members(copy), TypeParam::members(fresh));
+}
+
+}  // namespace

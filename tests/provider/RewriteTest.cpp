@@ -1,0 +1,256 @@
+// When the record file is rewritten, and what happens when it cannot be.
+
+#include "Sides.h"
+
+#include <gmock/gmock.h>
+
+#include <stdexcept>
+
+namespace {
+
+using namespace providerTest;
+using testing::Contains;
+using testing::IsEmpty;
+using testing::SizeIs;
+
+template <class Side>
+class Rewrite : public RecordStore<Side> {
+protected:
+    using Base = typename Side::Base;
+
+    static void change(Base& base, const std::string& text) { base.setProperty(Side::text, text); }
+
+    /** One record "A" with its text. */
+    static std::string fileWith(const std::string& text) {
+        std::string record = Side::defaultRecord;
+        record.replace(record.find('*'), 1, text);
+        return "1\nA\n" + record;
+    }
+
+    /** How often the file was rewritten, or tried to be, since the log was forgotten. */
+    static std::size_t rewrites() { return textsOf(Words<Side>::sourceFile, "flushCache").size(); }
+};
+
+TYPED_TEST_SUITE(Rewrite, Sides, SideNames);
+
+TYPED_TEST(Rewrite, FollowsAChangeWhenTheCursorEnds) {
+    this->fill({"A"});
+    {
+        typename TypeParam::Base base;
+        this->change(base, "ACME");
+        EXPECT_FALSE(std::filesystem::exists(this->path()));
+    }
+    EXPECT_EQ(this->file(), this->fileWith("ACME"));
+}
+
+TYPED_TEST(Rewrite, NeverFollowsReading) {
+    this->fill({"A"});
+    write(this->path(), "edited by somebody else");
+    {
+        typename TypeParam::Base base;
+        EXPECT_TRUE(stands(base));
+        EXPECT_EQ(this->identifier(base), "A");
+        TypeParam::select(base, "A");
+        ++base;
+        EXPECT_FALSE(stands(base));
+    }
+    EXPECT_EQ(this->file(), "edited by somebody else");
+}
+
+TYPED_TEST(Rewrite, NeverFollowsARefusedChange) {
+    this->fill({"A"});
+    {
+        typename TypeParam::Base base;
+        EXPECT_THROW(base.setProperty(TypeParam::number, std::string("text")), InstrumentationException);
+        EXPECT_THROW(base.setProperty(TypeParam::text, 5U), InstrumentationException);
+        EXPECT_THROW(TypeParam::create(base, "A"), InstrumentationException);
+        ++base;
+        EXPECT_THROW(TypeParam::remove(base), InstrumentationException);
+    }
+    EXPECT_FALSE(std::filesystem::exists(this->path()));
+}
+
+TYPED_TEST(Rewrite, HappensOnceForManyChanges) {
+    this->fill({"A"});
+    agentEnvironment::forgetLog();
+    {
+        typename TypeParam::Base base;
+        this->change(base, "first");
+        this->change(base, "second");
+        base.setProperty(TypeParam::number, 5U);
+        TypeParam::create(base, "B");
+        TypeParam::remove(base);
+    }
+    EXPECT_THAT(textsOf(Words<TypeParam>::sourceFile, "flushCache"),
+                testing::ElementsAre(entering("flushCache", Words<TypeParam>::sourceFile),
+                                     variable(Words<TypeParam>::countName, "1", Words<TypeParam>::sourceFile),
+                                     exiting("flushCache", Words<TypeParam>::sourceFile)));
+}
+
+TYPED_TEST(Rewrite, FollowsAChangeToTheSameValueToo) {
+    this->fill({"A"});
+    {
+        typename TypeParam::Base base;
+        base.setProperty(TypeParam::number, 0U);
+    }
+    EXPECT_EQ(this->file(), std::string("1\nA\n") + TypeParam::defaultRecord);
+}
+
+TYPED_TEST(Rewrite, FollowsDeletionOfTheOnlyRecord) {
+    this->fill({"A"});
+    {
+        typename TypeParam::Base base;
+        TypeParam::remove(base);
+    }
+    EXPECT_EQ(this->file(), "0\n");
+}
+
+TYPED_TEST(Rewrite, ReplacesWhateverTheFileHeld) {
+    this->fill({"A"});
+    write(this->path(), std::string(5000, 'x'));
+    {
+        typename TypeParam::Base base;
+        this->change(base, "ACME");
+    }
+    EXPECT_EQ(this->file(), this->fileWith("ACME"));
+}
+
+TYPED_TEST(Rewrite, CarriesChangesOfCursorsThatHaveNotEnded) {
+    this->fill({"A"});
+    typename TypeParam::Base longLived;
+    this->change(longLived, "ACME");
+    {
+        typename TypeParam::Base base;
+        base.setProperty(TypeParam::number, 0U);
+    }
+    EXPECT_EQ(this->file(), this->fileWith("ACME"));
+}
+
+TYPED_TEST(Rewrite, GivesWhatTheNextLoadingFinds) {
+    {
+        typename TypeParam::Base base;
+        TypeParam::create(base, "lease 1");
+        this->change(base, "ACME Leasing Co");
+        base.setProperty(TypeParam::number, 36U);
+        TypeParam::create(base, "lease 2");
+    }
+    typename TypeParam::Cache reloaded;
+    EXPECT_EQ(TypeParam::count(reloaded), 2U);
+    ASSERT_EQ(reloaded.table.size(), 2U);
+    EXPECT_EQ(reloaded.table[0].InstanceID, "lease 1");
+    EXPECT_EQ(reloaded.table[0].*TypeParam::textMember, "ACME Leasing Co");
+    EXPECT_EQ(reloaded.table[0].*TypeParam::numberMember, 36U);
+    EXPECT_EQ(reloaded.table[1].InstanceID, "lease 2");
+}
+
+TYPED_TEST(Rewrite, ThatFailsLeavesTheCursorsEndAsAnException) {
+    this->fill({"A"});
+    blockWithDirectory(this->path());
+    EXPECT_EQ(thrown<InstrumentationException>([&] {
+                  typename TypeParam::Base base;
+                  this->change(base, "ACME");
+              }),
+              Words<TypeParam>::cannotOpen);
+}
+
+TYPED_TEST(Rewrite, ThatFailsKeepsTheChangeInTheTable) {
+    this->fill({"A"});
+    blockWithDirectory(this->path());
+    EXPECT_THROW(
+        {
+            typename TypeParam::Base base;
+            this->change(base, "ACME");
+            TypeParam::create(base, "B");
+        },
+        InstrumentationException);
+    EXPECT_EQ(this->table().at(0).*TypeParam::textMember, "ACME");
+    EXPECT_EQ(this->count(), 2U);
+    std::filesystem::remove(this->path());
+    {
+        typename TypeParam::Base base;
+        TypeParam::select(base, "B");
+        TypeParam::remove(base);
+    }
+    EXPECT_EQ(this->file(), this->fileWith("ACME"));
+}
+
+TYPED_TEST(Rewrite, ThatFailsIsTriedOnceAndToldAtErrorLevel) {
+    this->fill({"A"});
+    blockWithDirectory(this->path());
+    agentEnvironment::forgetLog();
+    EXPECT_THROW(
+        {
+            typename TypeParam::Base base;
+            this->change(base, "ACME");
+        },
+        InstrumentationException);
+    const auto records = recordsOf(Words<TypeParam>::sourceFile, "flushCache");
+    ASSERT_EQ(records.size(), 3U);
+    EXPECT_EQ(withoutLine(records[2].text), message(Words<TypeParam>::cannotOpen, Words<TypeParam>::sourceFile));
+    EXPECT_EQ(records[2].level, 3000);
+}
+
+TYPED_TEST(Rewrite, WithoutADataDirectoryFails) {
+    this->fill({"A"});
+    std::filesystem::remove_all(agentEnvironment::dataDirectory());
+    EXPECT_EQ(thrown<InstrumentationException>([&] {
+                  typename TypeParam::Base base;
+                  this->change(base, "ACME");
+              }),
+              Words<TypeParam>::cannotOpen);
+}
+
+TYPED_TEST(Rewrite, ThatFailsWhileAnExceptionIsLeavingIsOnlyTold) {
+    this->fill({"A"});
+    blockWithDirectory(this->path());
+    agentEnvironment::forgetLog();
+    EXPECT_EQ(thrown<std::runtime_error>([&] {
+                  typename TypeParam::Base base;
+                  this->change(base, "ACME");
+                  throw std::runtime_error("the first one");
+              }),
+              "the first one");
+    const std::string destructor = std::string("~") + TypeParam::name + "Base";
+    const auto records = recordsOf(Words<TypeParam>::sourceFile, destructor);
+    const auto failure =
+        std::find_if(records.begin(), records.end(), [](const LogRecord& record) { return record.level == 3000; });
+    ASSERT_NE(failure, records.end());
+    EXPECT_EQ(withoutLine(failure->text), message(Words<TypeParam>::cannotOpen, Words<TypeParam>::sourceFile));
+    EXPECT_EQ(this->table().at(0).*TypeParam::textMember, "ACME");
+}
+
+TYPED_TEST(Rewrite, HappensWhileAnExceptionIsLeaving) {
+    this->fill({"A"});
+    EXPECT_EQ(thrown<std::runtime_error>([&] {
+                  typename TypeParam::Base base;
+                  this->change(base, "ACME");
+                  throw std::runtime_error("the first one");
+              }),
+              "the first one");
+    EXPECT_EQ(this->file(), this->fileWith("ACME"));
+}
+
+TYPED_TEST(Rewrite, ByTheTableItselfFailsWithTheSameException) {
+    blockWithDirectory(this->path());
+    EXPECT_EQ(thrown<InstrumentationException>([] { TypeParam::cache().flushCache(); }), Words<TypeParam>::cannotOpen);
+}
+
+using BothStores = RecordStore<LeaseSide>;
+
+TEST_F(BothStores, ShareNothing) {
+    {
+        LeaseBase lease;
+        lease.createLease("same");
+        WarrantyBase warranty;
+        EXPECT_FALSE(stands(warranty));
+        warranty.createWarranty("same");
+    }
+    EXPECT_EQ(contentOf(agentEnvironment::dataDirectory() / "Lease.dat"),
+              std::string("1\nsame\n") + LeaseSide::defaultRecord);
+    EXPECT_EQ(contentOf(agentEnvironment::dataDirectory() / "Warranty.dat"),
+              std::string("1\nsame\n") + WarrantySide::defaultRecord);
+    WarrantyBase::cache.table.clear();
+    WarrantyBase::cache.recordCountWarranty = 0;
+}
+
+}  // namespace
