@@ -1,0 +1,145 @@
+#include "AssetFixture.h"
+
+#include <cmpift.h>
+
+#include <functional>
+
+// No lock is held while the provider calls the object manager: another request may come out of such a call, and it
+// needs the asset file too.
+
+namespace contract {
+namespace {
+
+using testing::Each;
+using testing::SizeIs;
+using testsupport::named;
+using testsupport::text;
+
+/** Functions of the object manager that run something else first. One such object at a time. */
+class Interruption {
+public:
+    Interruption(const CMPIBroker& original, std::function<void()> itsBody)
+        : body(std::move(itsBody)), brokerHandle(original), makers(*original.eft), originalMakers(original.eft) {
+        makers.newObjectPath = &newObjectPath;
+        makers.newInstance = &newInstance;
+        brokerHandle.eft = &makers;
+        active = this;
+    }
+    ~Interruption() { active = nullptr; }
+    Interruption(const Interruption&) = delete;
+    Interruption& operator=(const Interruption&) = delete;
+
+    /** A broker whose makers are interrupted. */
+    const CMPIBroker* broker() const { return &brokerHandle; }
+
+    /** A result whose functions are interrupted. */
+    const CMPIResult* result(const CMPIResult* original) {
+        originalResult = original;
+        resultTable = *original->ft;
+        resultTable.returnInstance = &returnInstance;
+        resultTable.returnObjectPath = &returnObjectPath;
+        resultTable.returnDone = &returnDone;
+        resultHandle = {nullptr, &resultTable};
+        return &resultHandle;
+    }
+
+    int count = 0;
+
+private:
+    /** Not inside itself: what it runs calls the same functions. */
+    void interrupt() {
+        if (!isRunning) {
+            isRunning = true;
+            ++count;
+            body();
+            isRunning = false;
+        }
+    }
+
+    static CMPIObjectPath* newObjectPath(const CMPIBroker* broker, const char* nameSpaceName, const char* className,
+                                         CMPIStatus* rc) {
+        active->interrupt();
+        return active->originalMakers->newObjectPath(broker, nameSpaceName, className, rc);
+    }
+    static CMPIInstance* newInstance(const CMPIBroker* broker, const CMPIObjectPath* path, CMPIStatus* rc) {
+        active->interrupt();
+        return active->originalMakers->newInstance(broker, path, rc);
+    }
+    static CMPIStatus returnInstance(const CMPIResult*, const CMPIInstance* instance) {
+        active->interrupt();
+        return active->originalResult->ft->returnInstance(active->originalResult, instance);
+    }
+    static CMPIStatus returnObjectPath(const CMPIResult*, const CMPIObjectPath* path) {
+        active->interrupt();
+        return active->originalResult->ft->returnObjectPath(active->originalResult, path);
+    }
+    static CMPIStatus returnDone(const CMPIResult*) {
+        active->interrupt();
+        return active->originalResult->ft->returnDone(active->originalResult);
+    }
+
+    inline static Interruption* active = nullptr;
+    std::function<void()> body;
+    bool isRunning = false;
+    CMPIBroker brokerHandle;
+    CMPIBrokerEncFT makers;
+    const CMPIBrokerEncFT* originalMakers;
+    const CMPIResult* originalResult = nullptr;
+    CMPIResultFT resultTable{};
+    CMPIResult resultHandle{};
+};
+
+class AssetLockTest : public AssetTest {
+protected:
+    /** A request for the asset data that fails if the file's lock is held: the mutex tells of a second lock. */
+    void readAndWrite() {
+        const Outcome outcome = provider().enumerateInstances(path());
+        EXPECT_THAT(outcome, isOk(1));
+        ASSERT_THAT(outcome.instances(), SizeIs(1));
+        EXPECT_EQ(shownProperty(outcome.instances()[0], "AssetNumber"), "\"A-1\"");
+        const Instance changes = clientInstance(path(), {named("AssetNumber", text("A-1"))});
+        EXPECT_THAT(provider().modifyInstance(path(), changes), isOk(0));
+        EXPECT_THAT(loggedFailures(), testing::IsEmpty());
+    }
+};
+
+TEST_F(AssetLockTest, AnotherRequestMayComeOutOfTheResultsFunctions) {
+    writeData(assetFile, "USER.AssetNumber=A-1\n");
+    Interruption interruption(*broker.handle(), [this] { readAndWrite(); });
+    CMPIInstanceMI* interface = provider().instanceMI();
+    for (const bool names : {false, true}) {
+        const Outcome outcome =
+            provider().call([&](cimhost::RequestScope& scope, const CMPIContext* context, const CMPIResult* result) {
+                const CMPIResult* interrupted = interruption.result(result);
+                const CMPIObjectPath* all = scope.objectPath(path());
+                return names ? interface->ft->enumerateInstanceNames(interface, context, interrupted, all)
+                             : interface->ft->enumerateInstances(interface, context, interrupted, all, nullptr);
+            });
+        EXPECT_THAT(outcome, isOk(1));
+        EXPECT_THAT(outcome.events, SizeIs(2));
+    }
+    EXPECT_EQ(interruption.count, 4);
+}
+
+TEST_F(AssetLockTest, AnotherRequestMayComeOutOfTheBrokersFunctions) {
+    writeData(assetFile, "USER.AssetNumber=A-1\n");
+    Interruption interruption(*broker.handle(), [this] { readAndWrite(); });
+    CMPIStatus status{CMPI_RC_OK, nullptr};
+    provider().createInstanceMI(interruption.broker(), &status);
+    const Outcome outcome = provider().enumerateInstances(path());
+    EXPECT_THAT(outcome, isOk(1));
+    EXPECT_THAT(outcome.instances(), SizeIs(1));
+    EXPECT_EQ(interruption.count, 2);
+}
+
+TEST_F(AssetLockTest, TheLockIsGivenBackAfterEveryFailure) {
+    blockData(assetFile);
+    provider().enumerateInstances(path());
+    provider().modifyInstance(path(), clientInstance(path(), {}));
+    freeData(assetFile);
+    writeData(assetFile, "USER.AssetNumber=A-1\n");
+    readAndWrite();
+}
+
+}  // namespace
+}  // namespace contract
