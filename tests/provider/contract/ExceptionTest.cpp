@@ -1,0 +1,254 @@
+#include "RecordFixture.h"
+#include "ThrowingObjects.h"
+
+#include <functional>
+#include <stdexcept>
+
+// What an object manager written in C++ may do to a provider: throw out of its functions.
+
+namespace contract {
+namespace {
+
+using testing::ElementsAre;
+using testing::HasSubstr;
+using testing::IsEmpty;
+using testing::SizeIs;
+using testsupport::named;
+using testsupport::text;
+
+constexpr const char* thrownText = "the broker throws";
+
+class ExceptionTest : public RecordTest {
+protected:
+    using Alter = std::function<void(CMPIResultFT&)>;
+
+    /** An enumeration of instances whose result has some functions replaced. */
+    Outcome enumerateInto(const Alter& alter) {
+        return call(
+            [&](CMPIInstanceMI* interface, const CMPIContext* context, const CMPIResult* result,
+                const CMPIObjectPath* path) {
+                return interface->ft->enumerateInstances(interface, context, result, path, nullptr);
+            },
+            alter, allPath());
+    }
+
+    /** A creation of a record with such a result. */
+    Outcome createInto(const std::string& instanceId, const Alter& alter) {
+        return call(
+            [&](CMPIInstanceMI* interface, const CMPIContext* context, const CMPIResult* result,
+                const CMPIObjectPath* path) {
+                return interface->ft->createInstance(interface, context, result, path, nullptr);
+            },
+            alter, path(instanceId));
+    }
+
+    template <class Request>
+    Outcome call(Request request, const Alter& alter, const ObjectPath& path) {
+        CMPIInstanceMI* interface = provider().instanceMI();
+        return provider().call([&](auto& scope, const CMPIContext* context, const CMPIResult* result) {
+            Altered<CMPIResult> altered(result);
+            alter(altered.table);
+            return request(interface, context, altered.handle(), scope.objectPath(path));
+        });
+    }
+
+    /** The value that an action throws, an int; -1 when it throws none. */
+    template <class Action>
+    static int thrownNumber(Action action) {
+        try {
+            action();
+        } catch (int number) {
+            return number;
+        }
+        return -1;
+    }
+
+    /** Calls createInstance with nothing between it and the exception that it may throw. */
+    void createDirectly(const std::string& instanceId, const Alter& alter) {
+        CMPIInstanceMI* interface = provider().instanceMI();
+        cimhost::ResultEvents events;
+        cimhost::RequestScope scope(broker.broker());
+        Altered<CMPIResult> altered(scope.result(events));
+        alter(altered.table);
+        interface->ft->createInstance(interface, scope.context({}), altered.handle(),
+                                      scope.objectPath(path(instanceId)), nullptr);
+    }
+
+    static void throwError(CMPIResultFT& table) { throwFrom<std::runtime_error>(table.returnInstance); }
+    static void throwNumber(CMPIResultFT& table) { throwNumberFrom(table.returnInstance); }
+};
+
+TEST_P(ExceptionTest, AStandardExceptionEndsTheRequestAsASuccessWithoutItsEnd) {
+    createAll({"A", "B"});
+    const Outcome outcome = enumerateInto(throwError);
+    EXPECT_THAT(outcome, isOk(0));
+    EXPECT_THAT(outcome.events, IsEmpty());
+    EXPECT_THAT(caughtFailures(), ElementsAre(thrownText));
+}
+
+TEST_P(ExceptionTest, TheCaughtExceptionIsLoggedOnBothChannelsAsAnError) {
+    createAll({"A"});
+    agentEnvironment::forgetLog();
+    enumerateInto(throwError);
+    for (const char* channel : {"log", "trace"}) {
+        const std::vector<LogRecord> records = logOf(channel);
+        int found = 0;
+        for (const LogRecord& record : records) {
+            if (record.level == 3000) {
+                ++found;
+                EXPECT_EQ(record.text, "MESSAGE [File: LeaseAndWarrantyProvider.cpp, Line: " +
+                                           std::to_string(record.line) + "]: " + thrownText);
+                EXPECT_EQ(record.file, "LeaseAndWarrantyProvider.cpp");
+                EXPECT_EQ(record.logger, "Tarvik.LeaseAndWarrantyProvider");
+                EXPECT_EQ(record.function, "LeaseAndWarranty_EnumInstances");
+            }
+        }
+        EXPECT_EQ(found, 1);
+        ASSERT_GE(records.size(), 2U);
+        EXPECT_THAT(records[records.size() - 2].text, HasSubstr("EXITING: LeaseAndWarranty_EnumInstances()"));
+        EXPECT_EQ(records.back().text, std::string(78, '='));
+    }
+}
+
+TEST_P(ExceptionTest, ResultsBeforeTheExceptionStay) {
+    createAll({"A", "B", "C"});
+    static int calls;
+    calls = 0;
+    static CMPIStatus (*original)(const CMPIResult*, const CMPIInstance*);
+    const Outcome outcome = enumerateInto([](CMPIResultFT& table) {
+        original = table.returnInstance;
+        table.returnInstance = [](const CMPIResult* result, const CMPIInstance* instance) -> CMPIStatus {
+            if (++calls == 3) {
+                throw std::logic_error("third");
+            }
+            return original(result, instance);
+        };
+    });
+    EXPECT_THAT(outcome, isOk(0));
+    EXPECT_THAT(identifiersOf(outcome.instances()), ElementsAre("A", "B"));
+    EXPECT_THAT(caughtFailures(), ElementsAre("third"));
+}
+
+TEST_P(ExceptionTest, AnExceptionFromTheEndIsASuccessToo) {
+    createAll({"A"});
+    const Outcome outcome = enumerateInto([](CMPIResultFT& table) { throwFrom<std::runtime_error>(table.returnDone); });
+    EXPECT_THAT(outcome, isOk(0));
+    EXPECT_THAT(outcome.instances(), SizeIs(1));
+    EXPECT_THAT(caughtFailures(), ElementsAre(thrownText));
+}
+
+TEST_P(ExceptionTest, ExceptionsFromTheBrokersMakersAreCaught) {
+    createAll({"A"});
+    AlteredBroker altered(broker.handle());
+    throwFrom<std::runtime_error>(altered.makers.newInstance);
+    throwFrom<std::invalid_argument>(altered.makers.newObjectPath);
+    provider().createInstanceMI(altered.handle(), nullptr);
+    EXPECT_THAT(provider().enumerateInstances(allPath()), isOk(0));
+    EXPECT_THAT(provider().enumerateInstanceNames(allPath()), isOk(0));
+    EXPECT_THAT(remove("A"), isOk(0));
+    provider().createInstanceMI(broker.handle(), nullptr);
+    EXPECT_THAT(caughtFailures(), ElementsAre(thrownText, thrownText, thrownText));
+    EXPECT_THAT(identifiers(), ElementsAre("A")) << "the deletion looks at the record before it removes it";
+}
+
+TEST_P(ExceptionTest, ExceptionsFromTheRequestsPathAreCaught) {
+    createAll({"A"});
+    CMPIInstanceMI* interface = provider().instanceMI();
+    const Outcome outcome = provider().call([&](auto& scope, const CMPIContext* context, const CMPIResult* result) {
+        Altered<CMPIObjectPath> altered(scope.objectPath(path("A")));
+        throwFrom<std::runtime_error>(altered.table.getKey);
+        return interface->ft->getInstance(interface, context, result, altered.handle(), nullptr);
+    });
+    EXPECT_THAT(outcome, isOk(0));
+    EXPECT_THAT(outcome.events, IsEmpty());
+    EXPECT_THAT(caughtFailures(), ElementsAre(thrownText));
+}
+
+TEST_P(ExceptionTest, ValuesReadBeforeAnExceptionInAModificationAreWritten) {
+    createAll({"A"});
+    CMPIInstanceMI* interface = provider().instanceMI();
+    static CMPIData (*original)(const CMPIInstance*, const char*, CMPIStatus*);
+    static std::string lastProperty;
+    lastProperty = std::string(kind().name) == "Lease" ? "NetMonthlyLeaseRateFactor" : "Warrantor";
+    const Outcome outcome = provider().call([&](auto& scope, const CMPIContext* context, const CMPIResult* result) {
+        Altered<CMPIInstance> altered(
+            scope.instance(clientInstance(path("A"), {named(kind().numberProperty, testsupport::uint32(7))})));
+        original = altered.table.getProperty;
+        altered.table.getProperty = [](const CMPIInstance* instance, const char* name, CMPIStatus* status) -> CMPIData {
+            if (lastProperty == name) {
+                throw std::runtime_error("last property");
+            }
+            return original(instance, name, status);
+        };
+        return interface->ft->modifyInstance(interface, context, result, scope.objectPath(path("A")), altered.handle(),
+                                             nullptr);
+    });
+    EXPECT_THAT(outcome, isOk(0));
+    EXPECT_THAT(caughtFailures(), ElementsAre("last property"));
+    const std::string stored = *data();
+    const auto changed = recordOf("A");
+    EXPECT_EQ(changed, kind().shownRecord("A", {std::string(kind().numberProperty) + "=7"}));
+    unload();
+    EXPECT_EQ(recordOf("A"), changed) << stored;
+}
+
+TEST_P(ExceptionTest, ARecordMadeBeforeTheExceptionIsKeptAndWritten) {
+    const Outcome outcome = createInto("A", throwError);
+    EXPECT_THAT(outcome, isOk(0));
+    EXPECT_THAT(outcome.events, IsEmpty());
+    EXPECT_THAT(identifiers(), ElementsAre("A"));
+    EXPECT_EQ(data(), dataOfNew({"A"}));
+}
+
+TEST_P(ExceptionTest, AFailingRewriteBehindAnExceptionIsLoggedAndTheFirstExceptionGoesOn) {
+    blockData(kind().dataFile);
+    const Outcome outcome = createInto("A", throwError);
+    EXPECT_THAT(outcome, isOk(0));
+    EXPECT_THAT(outcome.events, IsEmpty());
+    EXPECT_THAT(caughtFailures(), ElementsAre(thrownText));
+    EXPECT_THAT(loggedFailures(), testing::Contains(kind().cannotOpen));
+    EXPECT_THAT(loggedFailures("trace"), testing::Contains(kind().cannotOpen));
+    EXPECT_THAT(identifiers(), ElementsAre("A"));
+}
+
+TEST_P(ExceptionTest, AnExceptionOfAnotherKindLeavesTheEntryPoint) {
+    EXPECT_EQ(thrownNumber([&] { createDirectly("A", throwNumber); }), 42);
+    EXPECT_THAT(loggedFailures(), IsEmpty());
+    EXPECT_EQ(data(), dataOfNew({"A"})) << "written while the exception leaves";
+    EXPECT_THAT(identifiers(), ElementsAre("A")) << "the provider goes on";
+    createAll({"B"});
+    EXPECT_THAT(identifiers(), ElementsAre("A", "B"));
+}
+
+TEST_P(ExceptionTest, AFailingRewriteBehindAnExceptionOfAnotherKindIsLoggedAndTheExceptionLeaves) {
+    blockData(kind().dataFile);
+    EXPECT_EQ(thrownNumber([&] { createDirectly("A", throwNumber); }), 42);
+    EXPECT_THAT(loggedFailures(), testing::Contains(kind().cannotOpen));
+    EXPECT_THAT(caughtFailures(), IsEmpty());
+    EXPECT_THAT(identifiers(), ElementsAre("A"));
+    freeData(kind().dataFile);
+    createAll({"B"});
+    EXPECT_EQ(data(), dataOfNew({"A", "B"}));
+}
+
+TEST_P(ExceptionTest, ARequestMadeWhileAnExceptionLeavesTheCallerIsServed) {
+    provider().instanceMI();
+    struct RequestAtEnd {
+        std::function<void()> request;
+        ~RequestAtEnd() { request(); }
+    };
+    Outcome outcome;
+    try {
+        const RequestAtEnd atEnd{[&] { outcome = create("A"); }};
+        throw std::runtime_error("the caller's");
+    } catch (const std::runtime_error&) {
+        EXPECT_THAT(identifiersOf(outcome.instances()), ElementsAre("A"));
+    }
+    EXPECT_THAT(outcome, isOk(1));
+    EXPECT_EQ(data(), dataOfNew({"A"}));
+}
+
+INSTANTIATE_RECORD_TEST(ExceptionTest);
+
+}  // namespace
+}  // namespace contract
