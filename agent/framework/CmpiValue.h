@@ -12,24 +12,24 @@ namespace KO {
  * Calls a function of a CMPI object's table, such as callTable<&CMPIObjectPathFT::getKeyCount>(path, &status).
  * Where the object, its table or the function is missing, the answer is zero.
  */
-template <auto function, typename Object, typename... Arguments>
+template <auto Function, typename Object, typename... Arguments>
 auto callTable(Object* object, Arguments... arguments) {
-    using Result = decltype((object->ft->*function)(object, arguments...));
-    if (object == nullptr || object->ft == nullptr || object->ft->*function == nullptr) {
+    using Result = decltype((object->ft->*Function)(object, arguments...));
+    if (object == nullptr || object->ft == nullptr || object->ft->*Function == nullptr) {
         return Result{};
     }
-    return (object->ft->*function)(object, arguments...);
+    return (object->ft->*Function)(object, arguments...);
 }
 
 /** The same for the functions by which a broker makes objects. An object made with a failing status is none. */
-template <auto function, typename... Arguments>
+template <auto Function, typename... Arguments>
 auto makeObject(const CMPIBroker* broker, Arguments... arguments) {
     CMPIStatus status{};
-    using Result = decltype((broker->eft->*function)(broker, arguments..., &status));
-    if (broker == nullptr || broker->eft == nullptr || broker->eft->*function == nullptr) {
+    using Result = decltype((broker->eft->*Function)(broker, arguments..., &status));
+    if (broker == nullptr || broker->eft == nullptr || broker->eft->*Function == nullptr) {
         return Result{};
     }
-    const Result object = (broker->eft->*function)(broker, arguments..., &status);
+    const Result object = (broker->eft->*Function)(broker, arguments..., &status);
     return status.rc == CMPI_RC_OK ? object : Result{};
 }
 

@@ -46,7 +46,7 @@ std::string make_string(const std::wstring& text) {
     std::string narrow;
     narrow.reserve(text.size());
     for (const wchar_t element : text) {
-        const auto number = static_cast<std::uint32_t>(element);
+        const auto number = std::uint32_t{std::char_traits<wchar_t>::to_int_type(element)};
         if (number >= firstByteCarrier && number <= lastByteCarrier) {
             narrow.push_back(static_cast<char>(number - byteCarrierBase));
         } else {

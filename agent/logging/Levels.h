@@ -7,14 +7,14 @@
 namespace RZLog {
 
 /** The two channels of the log. */
-enum class Channel { Log, Trace };
+enum class Channel { log, trace };
 
 /** The level up to which each channel takes records. */
 struct ChannelLevels {
     int log = 3000;
     int trace = 3000;
 
-    int of(Channel channel) const { return channel == Channel::Log ? log : trace; }
+    int of(Channel channel) const { return channel == Channel::log ? log : trace; }
 };
 
 /**

@@ -12,11 +12,11 @@ void readDestination(Agent::TableReader& table, LogSettings& settings) {
         return;
     }
     if (text == "syslog") {
-        settings.destination = LogSettings::Destination::Syslog;
+        settings.destination = LogSettings::Destination::syslog;
     } else if (text == "journal") {
-        settings.destination = LogSettings::Destination::Journal;
+        settings.destination = LogSettings::Destination::journal;
     } else if (text.front() == '/' && text.find('\0') == std::string::npos) {
-        settings.destination = LogSettings::Destination::File;
+        settings.destination = LogSettings::Destination::file;
         settings.file = text;
     } else {
         table.reject("destination", "must be an absolute path, \"syslog\", \"journal\" or \"none\"");

@@ -10,12 +10,12 @@ namespace RZLog {
 
 /** The [log] table of the agent's configuration. */
 struct LogSettings {
-    enum class Destination { None, File, Syslog, Journal };
+    enum class Destination { none, file, syslog, journal };
 
-    Destination destination = Destination::None;
-    std::string file;                              ///< path of the log file; empty for the other destinations
-    std::size_t rotationSize = 10U * 1024 * 1024;  ///< bytes after which the file is rotated
-    std::size_t rotationCount = 5;                 ///< how many rotated files are kept
+    Destination destination = Destination::none;
+    std::string file;                     ///< path of the log file; empty for the other destinations
+    std::size_t rotationSize = 10485760;  ///< bytes after which the file is rotated
+    std::size_t rotationCount = 5;        ///< how many rotated files are kept
     Levels levels;
 };
 

@@ -38,12 +38,12 @@ void writeIfAdmitted(const Record& record) noexcept {
 
 void RZLogger::logLevelMessage(const char* function, const char* file, int line, const std::string& logger, int level,
                                char* /*extra*/, int, int, const std::string& text) {
-    writeIfAdmitted({Channel::Log, level, logger, orEmpty(function), orEmpty(file), line, text});
+    writeIfAdmitted({Channel::log, level, logger, orEmpty(function), orEmpty(file), line, text});
 }
 
 void RZLogger::traceLevelMessage(const char* function, const char* file, int line, const std::string& logger, int level,
                                  char* /*extra*/, int, int, const std::string& text) {
-    writeIfAdmitted({Channel::Trace, level, logger, orEmpty(function), orEmpty(file), line, text});
+    writeIfAdmitted({Channel::trace, level, logger, orEmpty(function), orEmpty(file), line, text});
 }
 
 }  // namespace RZLog

@@ -31,7 +31,7 @@ protected:
  * Implementations waiting for their next buffer. No lock and nothing that a thread would have to
  * clean up: such a thing would keep the library in the process.
  */
-template <typename Element, std::size_t size>
+template <typename Element, std::size_t Size>
 class Pool {
 public:
     ~Pool() {
@@ -65,7 +65,7 @@ public:
     }
 
 private:
-    std::atomic<Element*> places[size] = {};
+    std::atomic<Element*> places[Size] = {};
 };
 
 }  // namespace

@@ -29,7 +29,7 @@ void appendTime(std::string& line, std::chrono::system_clock::time_point time) {
 }
 
 const char* nameOf(Channel channel) {
-    return channel == Channel::Log ? "log" : "trace";
+    return channel == Channel::log ? "log" : "trace";
 }
 
 bool isPrintable(char byte) {

@@ -10,7 +10,7 @@ namespace RZLog {
 
 /** One record on its way to the log. The texts are borrowed. */
 struct Record {
-    Channel channel = Channel::Log;
+    Channel channel = Channel::log;
     int level = 0;
     std::string_view logger;
     std::string_view function;

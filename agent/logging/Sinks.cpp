@@ -89,13 +89,13 @@ private:
 
 std::unique_ptr<Sink> openSink(const LogSettings& settings) {
     switch (settings.destination) {
-        case LogSettings::Destination::File:
+        case LogSettings::Destination::file:
             return prepareFile(settings.file) ? std::make_unique<FileSink>(settings) : nullptr;
-        case LogSettings::Destination::Syslog:
+        case LogSettings::Destination::syslog:
             return std::make_unique<SyslogSink>();
-        case LogSettings::Destination::Journal:
+        case LogSettings::Destination::journal:
             return std::make_unique<JournalSink>();
-        case LogSettings::Destination::None:
+        case LogSettings::Destination::none:
             break;
     }
     return nullptr;

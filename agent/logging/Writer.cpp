@@ -56,7 +56,7 @@ void reportProblems(const Agent::Problems& problems, const Levels& levels) {
     const std::string logger = "Ostrel.Agent";
     constexpr int level = 3000;
     for (const std::string& problem : problems) {
-        for (const Channel channel : {Channel::Log, Channel::Trace}) {
+        for (const Channel channel : {Channel::log, Channel::trace}) {
             if (levels.admit(channel, logger, level)) {
                 write({channel, level, logger, "configure", "Writer.cpp", __LINE__, problem});
             }

@@ -9,7 +9,7 @@ using RZLog::Levels;
 
 TEST(Levels, AdmitByDefaultWhatIsNotAboveTheErrorLevel) {
     const Levels levels;
-    for (const Channel channel : {Channel::Log, Channel::Trace}) {
+    for (const Channel channel : {Channel::log, Channel::trace}) {
         EXPECT_TRUE(levels.admit(channel, "any", 3000));
         EXPECT_FALSE(levels.admit(channel, "any", 3001));
     }
@@ -18,18 +18,18 @@ TEST(Levels, AdmitByDefaultWhatIsNotAboveTheErrorLevel) {
 TEST(Levels, OfAChannelDoNotTouchTheOther) {
     Levels levels;
     levels.setDefault({4000, 0});
-    EXPECT_TRUE(levels.admit(Channel::Log, "any", 4000));
-    EXPECT_FALSE(levels.admit(Channel::Trace, "any", 3000));
+    EXPECT_TRUE(levels.admit(Channel::log, "any", 4000));
+    EXPECT_FALSE(levels.admit(Channel::trace, "any", 3000));
 }
 
 TEST(Levels, OfALoggerHoldForItsExactNameOnly) {
     Levels levels;
     ASSERT_TRUE(levels.set("Ostrel.One", {6000, 100}));
-    EXPECT_TRUE(levels.admit(Channel::Log, "Ostrel.One", 6000));
-    EXPECT_FALSE(levels.admit(Channel::Trace, "Ostrel.One", 3000));
+    EXPECT_TRUE(levels.admit(Channel::log, "Ostrel.One", 6000));
+    EXPECT_FALSE(levels.admit(Channel::trace, "Ostrel.One", 3000));
     for (const char* other : {"Ostrel.one", "Ostrel.One.Two", "Ostrel.On", ""}) {
-        EXPECT_FALSE(levels.admit(Channel::Log, other, 6000)) << other;
-        EXPECT_TRUE(levels.admit(Channel::Trace, other, 3000)) << other;
+        EXPECT_FALSE(levels.admit(Channel::log, other, 6000)) << other;
+        EXPECT_TRUE(levels.admit(Channel::trace, other, 3000)) << other;
     }
 }
 
@@ -41,8 +41,8 @@ TEST(Levels, HaveRoomForSixtyFourLoggersWithNamesOfModestLength) {
         EXPECT_TRUE(levels.set("logger" + std::to_string(number), {number, 0}));
     }
     EXPECT_FALSE(levels.set("one too many", {9, 9}));
-    EXPECT_TRUE(levels.admit(Channel::Log, std::string(127, 'x'), 9));
-    EXPECT_FALSE(levels.admit(Channel::Log, std::string(127, 'x'), 10));
-    EXPECT_TRUE(levels.admit(Channel::Log, "logger63", 63));
-    EXPECT_FALSE(levels.admit(Channel::Log, "logger63", 64));
+    EXPECT_TRUE(levels.admit(Channel::log, std::string(127, 'x'), 9));
+    EXPECT_FALSE(levels.admit(Channel::log, std::string(127, 'x'), 10));
+    EXPECT_TRUE(levels.admit(Channel::log, "logger63", 63));
+    EXPECT_FALSE(levels.admit(Channel::log, "logger63", 64));
 }

@@ -24,20 +24,20 @@ protected:
 
 TEST_F(LogSettingsTest, HaveDefaults) {
     const LogSettings settings = read("");
-    EXPECT_EQ(settings.destination, LogSettings::Destination::None);
+    EXPECT_EQ(settings.destination, LogSettings::Destination::none);
     EXPECT_EQ(settings.rotationSize, 10485760U);
     EXPECT_EQ(settings.rotationCount, 5U);
-    EXPECT_TRUE(settings.levels.admit(Channel::Log, "any", 3000));
-    EXPECT_FALSE(settings.levels.admit(Channel::Trace, "any", 4000));
+    EXPECT_TRUE(settings.levels.admit(Channel::log, "any", 3000));
+    EXPECT_FALSE(settings.levels.admit(Channel::trace, "any", 4000));
     EXPECT_THAT(problems, IsEmpty());
 }
 
 TEST_F(LogSettingsTest, TakeEveryDestination) {
-    EXPECT_EQ(read("[log]\ndestination = 'none'").destination, LogSettings::Destination::None);
-    EXPECT_EQ(read("[log]\ndestination = 'syslog'").destination, LogSettings::Destination::Syslog);
-    EXPECT_EQ(read("[log]\ndestination = 'journal'").destination, LogSettings::Destination::Journal);
+    EXPECT_EQ(read("[log]\ndestination = 'none'").destination, LogSettings::Destination::none);
+    EXPECT_EQ(read("[log]\ndestination = 'syslog'").destination, LogSettings::Destination::syslog);
+    EXPECT_EQ(read("[log]\ndestination = 'journal'").destination, LogSettings::Destination::journal);
     const LogSettings settings = read("[log]\ndestination = '/var/log/agent.log'");
-    EXPECT_EQ(settings.destination, LogSettings::Destination::File);
+    EXPECT_EQ(settings.destination, LogSettings::Destination::file);
     EXPECT_EQ(settings.file, "/var/log/agent.log");
     EXPECT_THAT(problems, IsEmpty());
 }
@@ -45,7 +45,7 @@ TEST_F(LogSettingsTest, TakeEveryDestination) {
 TEST_F(LogSettingsTest, RefuseADestinationThatIsNeitherPathNorWord) {
     for (const char* text : {"[log]\ndestination = 'agent.log'", "[log]\ndestination = \"/a\\u0000b\""}) {
         problems.clear();
-        EXPECT_EQ(read(text).destination, LogSettings::Destination::None);
+        EXPECT_EQ(read(text).destination, LogSettings::Destination::none);
         EXPECT_THAT(problems, ElementsAre("configuration key log.destination must be an absolute path, \"syslog\", "
                                           "\"journal\" or \"none\"; ignored"));
     }
@@ -61,10 +61,10 @@ TEST_F(LogSettingsTest, TakeRotation) {
 TEST_F(LogSettingsTest, GiveALoggerTheGeneralLevelsThatItHasNotItself) {
     const LogSettings settings =
         read("[log]\nlog_level = 4000\ntrace_level = 100\n[[log.logger]]\nname = 'one'\ntrace_level = 6000\n");
-    EXPECT_TRUE(settings.levels.admit(Channel::Log, "one", 4000));
-    EXPECT_FALSE(settings.levels.admit(Channel::Log, "one", 4001));
-    EXPECT_TRUE(settings.levels.admit(Channel::Trace, "one", 6000));
-    EXPECT_FALSE(settings.levels.admit(Channel::Trace, "two", 101));
+    EXPECT_TRUE(settings.levels.admit(Channel::log, "one", 4000));
+    EXPECT_FALSE(settings.levels.admit(Channel::log, "one", 4001));
+    EXPECT_TRUE(settings.levels.admit(Channel::trace, "one", 6000));
+    EXPECT_FALSE(settings.levels.admit(Channel::trace, "two", 101));
     EXPECT_THAT(problems, IsEmpty());
 }
 

@@ -36,7 +36,7 @@ public:
     TimeZone& operator=(const TimeZone&) = delete;
 };
 
-const Record sample{Channel::Trace, 4000, "Ostrel.Test", "getLessor", "Lease.cpp", 42, "ENTERING: x"};
+const Record sample{Channel::trace, 4000, "Ostrel.Test", "getLessor", "Lease.cpp", 42, "ENTERING: x"};
 
 }  // namespace
 
@@ -56,13 +56,13 @@ TEST(LogRecord, CarriesLocalTimeWithItsOffset) {
 }
 
 TEST(LogRecord, EscapesEveryTextField) {
-    const Record forged{Channel::Log, 3000, "a\tb", "c\nd", "e\rf", 1, "g\nh"};
+    const Record forged{Channel::log, 3000, "a\tb", "c\nd", "e\rf", 1, "g\nh"};
     EXPECT_THAT(RZLog::fileLine(forged, moment(0, 0)),
                 MatchesRegex(R"([^	]+	log	3000	a\\tb	c\\nd	e\\rf	1	g\\nh)"));
 }
 
 TEST(LogRecord, ForASystemLogIsOneLineWithoutTime) {
-    const Record forged{Channel::Log, 3000, "Ostrel.Test", "load", "Lease.cpp", 42, "bad\nline"};
+    const Record forged{Channel::log, 3000, "Ostrel.Test", "load", "Lease.cpp", 42, "bad\nline"};
     EXPECT_EQ(RZLog::systemLogLine(forged), "log 3000 Ostrel.Test load() in Lease.cpp:42: bad\\nline");
 }
 
