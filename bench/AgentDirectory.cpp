@@ -37,6 +37,7 @@ void AgentDirectory::removeRecords() const {
     }
 }
 
+/** A path goes to a stream in quotes, as TOML wants it. */
 void AgentDirectory::writeConfiguration(const fs::path& file) const {
     std::ofstream stream(file);
     stream << "[directories]\ndata = " << data() << "\ninstall = " << root << "\n[product]\nname = \"" << names::agent

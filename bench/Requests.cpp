@@ -124,7 +124,9 @@ void requireSame(const cimhost::ResultEvents& answers, const cimhost::ResultEven
         const std::string answer = described(answers[index]);
         const std::string wanted = described(expected[index]);
         if (answer != wanted) {
-            throw std::runtime_error("answer " + std::to_string(index) + " is\n" + answer + "\nand not\n" + wanted);
+            std::string difference = "answer " + std::to_string(index) + " is\n";
+            difference.append(answer).append("\nand not\n").append(wanted);
+            throw std::runtime_error(difference);
         }
     }
 }

@@ -1,0 +1,143 @@
+#!/usr/bin/env python3
+"""Runs the benchmarks and puts their figures into docs/performance.md.
+
+usage: bench/report.py BUILD_DIRECTORY [--min-time SECONDS] [--runs N] [--print]
+
+The figures stand between two marker lines of the document and replace what was there; with --print
+they go to standard output and the document stays as it is. Nothing is written unless every
+benchmark ran and every answer was right.
+"""
+
+import argparse
+import json
+import os
+import pathlib
+import subprocess
+import sys
+
+DOCUMENT = pathlib.Path(__file__).resolve().parent.parent / "docs" / "performance.md"
+BEGIN = "<!-- figures of bench/report.py begin -->\n"
+END = "<!-- figures of bench/report.py end -->\n"
+SIDES = ("provider", "floor")
+
+
+def run(program, min_time):
+    """The result of the benchmark program as Google Benchmark's JSON."""
+    command = [program, "--benchmark_format=json", f"--benchmark_min_time={min_time}"]
+    done = subprocess.run(command, stdout=subprocess.PIPE, text=True, check=False)
+    if done.returncode != 0:
+        sys.exit(f"{program} failed; nothing is reported")
+    return json.loads(done.stdout)
+
+
+def measured(results):
+    """{(operation, class): {size: {side: best nanoseconds}}}, in the order of the program."""
+    cases = {}
+    units = {"ns": 1, "us": 1e3, "ms": 1e6, "s": 1e9}
+    for one in (benchmark for result in results for benchmark in result["benchmarks"]):
+        operation, class_name, side, size = one["name"].split("/")[:4]
+        times = cases.setdefault((operation, class_name), {}).setdefault(int(size), {})
+        time = one["real_time"] * units[one["time_unit"]]
+        times[side] = min(time, times.get(side, time))
+    for case, sizes in cases.items():
+        for size, times in sizes.items():
+            if set(times) != set(SIDES):
+                sys.exit(f"{case} with {size} records has not both sides")
+    return cases
+
+
+def time_text(nanoseconds):
+    for unit, length in (("s", 1e9), ("ms", 1e6), ("µs", 1e3)):
+        if nanoseconds >= length:
+            return f"{nanoseconds / length:.3g} {unit}"
+    return f"{nanoseconds:.3g} ns"
+
+
+def ratio_text(times):
+    ratio = times["provider"] / times["floor"]
+    return f"{ratio:.1f}" if ratio < 99.95 else f"{ratio:,.0f}"
+
+
+def table(head, rows):
+    lines = ["| " + " | ".join(head) + " |", "|---|---|" + "---:|" * (len(head) - 2)]
+    lines += ["| " + " | ".join(row) + " |" for row in rows]
+    return "\n".join(lines) + "\n"
+
+
+def sizes_table(cases, sizes, text):
+    """One row a case, one column a size."""
+    rows = []
+    for (operation, class_name), by_size in cases.items():
+        cells = [text(by_size[size]) if size in by_size else "" for size in sizes]
+        rows.append([operation, class_name, *cells])
+    return table(["Request", "Class", *(f"{size:,}" for size in sizes)], rows)
+
+
+def single_table(cases):
+    rows = []
+    for (operation, class_name), by_size in cases.items():
+        for times in by_size.values():
+            cells = [time_text(times[side]) for side in SIDES]
+            rows.append([operation, class_name, *cells, ratio_text(times)])
+    return table(["Request", "Class", "Provider", "Floor", "Ratio"], rows)
+
+
+def processor():
+    with open("/proc/cpuinfo", encoding="utf-8") as file:
+        for line in file:
+            if line.startswith("model name"):
+                return line.split(":", 1)[1].strip()
+    return "unknown processor"
+
+
+def machine(context):
+    return (f"Machine: {os.cpu_count()} cores, {processor()}. Compiler: {context['compiler']}, "
+            f"build type {context['build_type']}.\n")
+
+
+def figures(results):
+    cases = measured(results)
+    tables = {case: sizes for case, sizes in cases.items() if len(sizes) > 1}
+    singles = {case: sizes for case, sizes in cases.items() if len(sizes) == 1}
+    sizes = sorted({size for by_size in tables.values() for size in by_size})
+    return "\n".join([
+        machine(results[0]["context"]),
+        "### Ratio provider/floor, by number of records\n",
+        sizes_table(tables, sizes, ratio_text),
+        "### Time of the provider, by number of records\n",
+        sizes_table(tables, sizes, lambda times: time_text(times["provider"])),
+        "### Time of the floor, by number of records\n",
+        sizes_table(tables, sizes, lambda times: time_text(times["floor"])),
+        "### Agent, asset data, and associations with 1,000 leases\n",
+        single_table(singles),
+    ])
+
+
+def replace_figures(text):
+    document = DOCUMENT.read_text(encoding="utf-8")
+    before, begin, rest = document.partition(BEGIN)
+    _, end, after = rest.partition(END)
+    if not begin or not end:
+        sys.exit(f"{DOCUMENT} has not the two marker lines")
+    DOCUMENT.write_text(before + begin + "\n" + text + "\n" + end + after, encoding="utf-8")
+
+
+def main():
+    parser = argparse.ArgumentParser(description="Runs the benchmarks and reports their figures.")
+    parser.add_argument("build_directory", type=pathlib.Path)
+    parser.add_argument("--min-time", type=float, default=0.1, metavar="SECONDS",
+                        help="how long each benchmark runs at least")
+    parser.add_argument("--runs", type=int, default=1, metavar="N",
+                        help="how often everything is run; the best time of each is kept")
+    parser.add_argument("--print", action="store_true", help="leave the document alone")
+    arguments = parser.parse_args()
+    program = arguments.build_directory / "bin" / "provider_benchmark"
+    text = figures([run(program, arguments.min_time) for _ in range(arguments.runs)])
+    if arguments.print:
+        print(text)
+    else:
+        replace_figures(text)
+
+
+if __name__ == "__main__":
+    main()
