@@ -94,8 +94,9 @@ CMPIInstance* ProductAdapter<Policy>::getCMPIInstance(const char** properties) {
 template <class Policy>
 template <class ModifiablePolicy>
 void ProductAdapter<Policy>::modifyCMPIInstance(const CMPIInstance* referenceInstance, const char** properties) {
-    const Traced traced(at(Policy::unit), label::referenceInstance, referenceInstance, label::propertiesBare,
-                        properties);
+    // Named here, since the compiler's name of a function template carries its argument.
+    const Traced traced(at(Policy::unit, Level::flow, "modifyCMPIInstance"), label::referenceInstance,
+                        referenceInstance, label::propertiesBare, properties);
     if (referenceInstance != nullptr) {
         ModifiablePolicy::modify(element, referenceInstance);
     }
