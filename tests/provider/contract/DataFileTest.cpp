@@ -1,0 +1,194 @@
+#include "RecordModel.h"
+
+#include <algorithm>
+
+// The record files, byte for byte, and what a restart makes of them.
+
+namespace contract {
+namespace {
+
+using testing::ElementsAre;
+using testing::IsEmpty;
+using testing::SizeIs;
+using testsupport::named;
+using testsupport::text;
+using testsupport::uint32;
+
+constexpr const char* noDate = "00000000000000.000000-000";
+
+class DataFileTest : public RecordTest {
+protected:
+    /** The file's content with one record "A" that has these two lines after its identifier and nothing else. */
+    std::string oneRecord(const std::string& textLine, const std::string& dateLine,
+                          const std::string& identifier = "A") {
+        const std::string defaults = kind().defaultFields;
+        return "1\n" + identifier + "\n" + textLine + "\n" + dateLine + "\n" +
+               defaults.substr(std::string("*\n").size() + std::string(noDate).size() + 1);
+    }
+
+    /** What the text property is after a restart, when this was sent. */
+    std::string afterRestart(const std::string& sent) {
+        modify("A", {named(kind().textProperty, text(sent))});
+        unload();
+        const auto instances = get("A").instances();
+        EXPECT_THAT(instances, SizeIs(1));
+        return testsupport::textOf(instances.at(0).properties, kind().textProperty).value_or("(none)");
+    }
+};
+
+TEST_P(DataFileTest, BlanksInTextsAreWrittenAsUnderscoresAndComeBackAsBlanks) {
+    createAll({"A"});
+    EXPECT_EQ(afterRestart("ACME Leasing Co"), "ACME Leasing Co");
+    EXPECT_EQ(data(), oneRecord("ACME_Leasing_Co", noDate));
+    EXPECT_EQ(afterRestart("with_underscore"), "with underscore");
+    EXPECT_EQ(data(), oneRecord("with_underscore", noDate));
+}
+
+TEST_P(DataFileTest, TextsOfOneCharacterAreLostAtARestart) {
+    createAll({"A"});
+    for (const char* lost : {"X", "*", " ", "_", ""}) {
+        EXPECT_EQ(afterRestart(lost), "") << lost;
+        EXPECT_EQ(data(), oneRecord("*", noDate)) << lost;
+    }
+    EXPECT_EQ(afterRestart("XY"), "XY");
+    EXPECT_EQ(afterRestart("**"), "**");
+}
+
+TEST_P(DataFileTest, IdentifiersWithBlanksAndUnderscoresComeBackWithBlanks) {
+    createAll({"record 1"});
+    EXPECT_EQ(data(), dataOfNew({"record_1"}));
+    createAll({"record_1"});
+    EXPECT_EQ(data(), dataOfNew({"record_1", "record_1"}));
+    unload();
+    EXPECT_THAT(identifiers(), ElementsAre("record 1", "record 1"));
+    EXPECT_THAT(recordOf("record_1"), IsEmpty());
+}
+
+TEST_P(DataFileTest, DatesShorterThanADatetimeAreWrittenAsNone) {
+    createAll({"A"});
+    for (const char* brief : {"", "x", "20240506070809.123456+12"}) {
+        modify("A", {named(kind().dateProperty, text("20240506070809.123456+120"))});
+        modify("A", {named(kind().dateProperty, text(brief))});
+        EXPECT_EQ(data(), oneRecord("*", noDate)) << brief;
+    }
+}
+
+TEST_P(DataFileTest, DatesOfADatetimesLengthOrMoreAreWrittenUnchanged) {
+    createAll({"A"});
+    for (const char* date :
+         {"20240506070809.123456+120", "20240506070809.123456+1200", "no date but long enough here"}) {
+        modify("A", {named(kind().dateProperty, text(date))});
+        EXPECT_EQ(data(), oneRecord("*", date));
+    }
+}
+
+TEST_P(DataFileTest, ARecordAlwaysTakesItsNumberOfLines) {
+    createAll({"A", "B", "C"});
+    modify("B", {named(kind().textProperty, text("a b c")), named(kind().numberProperty, uint32(4294967295U))});
+    const std::string content = *data();
+    EXPECT_EQ(static_cast<std::size_t>(std::count(content.begin(), content.end(), '\n')), 1 + 3 * kind().linesOfRecord);
+    EXPECT_EQ(content.find('\r'), std::string::npos);
+    EXPECT_EQ(content.back(), '\n');
+}
+
+TEST_P(DataFileTest, ARestartKeepsTheOrderOfTheRecordsAndForgetsDeletedOnes) {
+    createAll({"C", "A", "B", "D"});
+    remove("A");
+    createAll({"A"});
+    remove("C");
+    EXPECT_EQ(data(), dataOfNew({"B", "D", "A"}));
+    unload();
+    EXPECT_THAT(identifiers(), ElementsAre("B", "D", "A"));
+    EXPECT_EQ(data(), dataOfNew({"B", "D", "A"}));
+}
+
+TEST_P(DataFileTest, ManyRecordsSurviveARestart) {
+    std::vector<std::string> many;
+    for (int number = 0; number < 40; ++number) {
+        many.push_back("record" + std::to_string(number));
+    }
+    createAll(many);
+    EXPECT_EQ(data(), dataOfNew(many));
+    unload();
+    EXPECT_EQ(identifiers(), many);
+}
+
+TEST_P(DataFileTest, AnEmptyIdentifierShiftsTheFieldsOfItsRecord) {
+    createAll({""});
+    modify("", {named(kind().textProperty, text("the text"))});
+    EXPECT_EQ(data(), oneRecord("the_text", noDate, ""));
+    unload();
+    EXPECT_THAT(identifiers(), ElementsAre("the text"));
+}
+
+TEST_P(DataFileTest, AFileThatIsShorterThanItsCountRepeatsTheLastRecord) {
+    writeData(kind().dataFile, "3\n" + dataOfNew({"A"}).substr(2));
+    EXPECT_THAT(identifiers(), ElementsAre("A", "A", "A"));
+    EXPECT_THAT(loggedFailures(), IsEmpty());
+    createAll({"B"});
+    EXPECT_EQ(data(), dataOfNew({"A", "A", "A", "B"}));
+}
+
+TEST_P(DataFileTest, RecordsBeyondTheCountAreNotReadAndVanishAtTheNextChange) {
+    writeData(kind().dataFile, "1\n" + dataOfNew({"A", "B"}).substr(2));
+    EXPECT_THAT(identifiers(), ElementsAre("A"));
+    remove("A");
+    EXPECT_EQ(data(), "0\n");
+}
+
+TEST_P(DataFileTest, ACountThatIsNoneMeansNoRecords) {
+    for (const char* count :
+         {"", "\n", "0\n", "0", "none\n", "-1\n", "+1\n", "99999999999999999999\n", ".5\n", "\xff\n"}) {
+        writeData(kind().dataFile, count + dataOfNew({"A"}).substr(2));
+        EXPECT_THAT(identifiers(), IsEmpty()) << count;
+        EXPECT_THAT(provider().deleteInstance(path("A")), isOk(0));
+        createAll({"N"});
+        EXPECT_EQ(data(), dataOfNew({"N"})) << count;
+        unload();
+    }
+}
+
+TEST_P(DataFileTest, ACountThatNoMemoryHoldsMeansNoRecords) {
+    writeData(kind().dataFile, "4294967295\n");
+    EXPECT_THAT(identifiers(), IsEmpty());
+    createAll({"N"});
+    EXPECT_EQ(data(), dataOfNew({"N"}));
+}
+
+TEST_P(DataFileTest, LinesEndedAsOnOtherSystemsAreReadAlike) {
+    std::string content;
+    for (const char character : dataOfNew({"A", "B"})) {
+        content += character == '\n' ? "\r\n" : std::string(1, character);
+    }
+    writeData(kind().dataFile, "  " + content);
+    EXPECT_THAT(identifiers(), ElementsAre("A", "B"));
+    EXPECT_EQ(recordOf("B"), kind().shownRecord("B"));
+}
+
+TEST_P(DataFileTest, ANumberThatIsNoneEndsTheReadingAndLaterRecordsRepeatWhatWasRead) {
+    RecordModel model(kind());
+    model.records = {model.newRecord("A"), model.newRecord("B"), model.newRecord("C")};
+    const std::string sound = model.written();
+    const std::size_t second = sound.find("\nB\n") + 3;
+    const std::string number = std::string(noDate) + "\n";
+    std::string broken = sound;
+    broken.replace(sound.find(number, second) + number.size(), 1, "many");
+    writeData(kind().dataFile, broken);
+    EXPECT_THAT(identifiers(), ElementsAre("A", "B", "B"));
+}
+
+INSTANTIATE_RECORD_TEST(DataFileTest);
+
+TEST_F(ProviderTest, AFlagThatIsAWordEndsTheReadingOfALease) {
+    writeData("Lease.dat",
+              "2\nA\nThe_Lessor\n00000000000000.000000-000\n12\ntrue\n1\n1\n1\n100\n200\n300\n400\n5\n"
+              "B\n*\n00000000000000.000000-000\n0\n0\n0\n0\n0\n*\n*\n*\n*\n0\n");
+    const auto instances = provider().enumerateInstances(classPath("VELKO_Lease")).instances();
+    const std::vector<std::string> asRead = lease.shownRecord("A", {"Lessor=\"The Lessor\"", "LeaseTerm=12"});
+    ASSERT_THAT(instances, SizeIs(2));
+    EXPECT_EQ(shown(instances[0].properties), asRead);
+    EXPECT_EQ(shown(instances[1].properties), asRead) << "nothing more is read, so the record repeats";
+}
+
+}  // namespace
+}  // namespace contract
