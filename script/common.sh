@@ -82,5 +82,7 @@ source_files() {
 
 # The shell scripts of the project, likewise.
 shell_scripts() {
-    git ls-files -z | xargs -0 awk 'FNR == 1 && /^#!.*sh$|shellcheck shell=/ { printf "%s%c", FILENAME, 0 } FNR > 2 { nextfile }'
+    git ls-files -z | xargs -0 awk '
+        (FNR == 1 && /^#!.*sh$/) || (FNR == 2 && /shellcheck shell=/) { printf "%s%c", FILENAME, 0 }
+        FNR == 2 { nextfile }'
 }
