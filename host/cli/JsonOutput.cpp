@@ -123,16 +123,35 @@ Json providerJson(const ProviderRegistration& provider) {
             {"unload", textOrNull(provider.unload)}, {"source", provider.source}};
 }
 
+/** The value of the qualifier of that name; null without one. Works for classes and properties. */
+template <typename Qualified>
+Json qualifierJson(const Qualified& qualified, const char* name) {
+    const Qualifier* qualifier = qualified.findQualifier(name);
+    return qualifier != nullptr ? contentJson(qualifier->value) : Json(nullptr);
+}
+
+Json propertyJson(const Property& property) {
+    return {{"name", property.name},
+            {"type", typeName(property.type)},
+            {"array", property.isArray},
+            {"referenceClass", textOrNull(property.referenceClass)},
+            {"key", property.isKey()},
+            {"writable", qualifierJson(property, "Write") == Json(true)},
+            {"description", qualifierJson(property, "Description")}};
+}
+
 Json classJson(const ListedClass& listed) {
-    Json object = {{"class", listed.name}, {"inSchema", listed.definition != nullptr}};
-    object["superclass"] = listed.definition != nullptr ? textOrNull(listed.definition->superclass) : Json(nullptr);
-    object["association"] = listed.definition != nullptr && listed.definition->isAssociation();
-    object["keys"] = Json::array();
-    if (listed.definition != nullptr) {
-        object["keys"] = listJson(listed.definition->keys(), [](const Property* key) { return Json(key->name); });
-    }
-    object["providers"] = listJson(listed.providers, providerJson);
-    return object;
+    const Class* definition = listed.definition;
+    const bool known = definition != nullptr;
+    const auto keyName = [](const Property* key) { return Json(key->name); };
+    return {{"class", listed.name},
+            {"inSchema", known},
+            {"superclass", known ? textOrNull(definition->superclass) : Json(nullptr)},
+            {"association", known && definition->isAssociation()},
+            {"description", known ? qualifierJson(*definition, "Description") : Json(nullptr)},
+            {"keys", known ? listJson(definition->keys(), keyName) : Json::array()},
+            {"properties", known ? listJson(definition->properties, propertyJson) : Json::array()},
+            {"providers", listJson(listed.providers, providerJson)}};
 }
 
 std::string dumped(const Json& document) {

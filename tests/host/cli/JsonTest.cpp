@@ -63,7 +63,12 @@ TEST(JsonOutput, ClassesHaveKeysAndProviders) {
     const Json classes = jsonOf({"classes"});
     ASSERT_EQ(classes.size(), 8U);
     EXPECT_EQ(classes[1], Json::parse(R"({"class": "Test_Contains", "inSchema": true, "superclass": null,
-        "association": true, "keys": ["Outer", "Inner"], "providers": [{"provider": "CliTest",
+        "association": true, "description": null, "keys": ["Outer", "Inner"], "properties": [
+            {"name": "Outer", "type": "reference", "array": false, "referenceClass": "Test_Box", "key": true,
+             "writable": false, "description": null},
+            {"name": "Inner", "type": "reference", "array": false, "referenceClass": "Test_Box", "key": true,
+             "writable": false, "description": null}],
+        "providers": [{"provider": "CliTest",
         "location": "cli_test_provider", "instance": true, "association": true, "namespaces": ["root/cimv2"],
         "group": "boxes", "unload": null, "source": ")" +
                                       dataFile("test.reg") + R"(:9"}]})"));
