@@ -18,9 +18,10 @@ std::string& root() {
 }
 
 void writeConfiguration(const fs::path& file) {
+    const std::string version = &agentVersion != nullptr ? agentVersion : "4.2.0";
     std::ofstream stream(file);
     stream << "[directories]\ninstall = \"" << installDirectory().string() << "\"\ndata = \""
-           << dataDirectory().string() << "\"\n[product]\nname = \"Test Agent\"\nversion = \"4.2.0\"\n"
+           << dataDirectory().string() << "\"\n[product]\nname = \"Test Agent\"\nversion = \"" << version << "\"\n"
            << "build_number = \"77\"\nidentifying_number = \"ID-1\"\nvendor = \"VEL\"\n"
            << "[log]\ndestination = \"" << logFile().string() << "\"\nlog_level = 9999\ntrace_level = 9999\n"
            << "[instrumentation]\ndiscover = false\n"

@@ -14,6 +14,9 @@
  */
 extern const char* const agentNodes;
 
+/** The version of the agent product, for programs that define it likewise; "4.2.0" in all others. */
+extern const char* const agentVersion __attribute__((weak));
+
 namespace agentEnvironment {
 
 /** One computer, named "testhost", whose product is "Model X - Tower" by "Example Maker". */

@@ -1,0 +1,205 @@
+// The asset element as a cursor over the computers, and what it says of each.
+
+#include "AssetIDDetails.h"
+#include "Support.h"
+
+#include <gmock/gmock.h>
+
+#include <cstdio>
+#include <ctime>
+
+namespace {
+
+using namespace providerTest;
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+using KO::LeaseWarrantyProvider::AssetIDDetails;
+
+class AssetCursor : public CleanAgent {
+protected:
+    static std::string name(const AssetIDDetails& element) {
+        std::string text = "(none)";
+        element.getName(text);
+        return text;
+    }
+
+    static std::vector<std::string> walked(AssetIDDetails& element) {
+        std::vector<std::string> names;
+        for (; element; ++element) {
+            names.push_back(name(element));
+        }
+        return names;
+    }
+
+    static void filter(AssetIDDetails& element, int type, const std::string& value) {
+        element.setFilter(static_cast<AssetIDDetails::FilterType>(type), value);
+    }
+
+    /** The product name that the computer of a name has, if any, given into a text. */
+    static bool productName(const std::string& computer, std::string& text) {
+        AssetIDDetails element;
+        filter(element, AssetIDDetails::FILTER_NAME, computer);
+        EXPECT_EQ(name(element), computer);
+        return element.getProductName(text);
+    }
+};
+
+TEST_F(AssetCursor, VisitsEveryComputerWithoutEvaluatingBeforeAFilterIsSet) {
+    AssetIDDetails element;
+    EXPECT_THAT(walked(element), ElementsAre("spaced", "tight", "dashless", "dash first", "dash second", "many dashes",
+                                             "empty", "productless", "(none)"));
+    EXPECT_THAT(textsOf("AssetIDDetails.cpp", "evaluate"), IsEmpty());
+    EXPECT_TRUE(element.evaluate());
+}
+
+TEST_F(AssetCursor, StandsOnTheComputerOfTheNameFilterAndOnThoseWhoseNameCannotBeRead) {
+    AssetIDDetails element;
+    filter(element, AssetIDDetails::FILTER_NAME, "tight");
+    EXPECT_THAT(walked(element), ElementsAre("tight", "(none)"));
+}
+
+TEST_F(AssetCursor, StaysAtTheEnd) {
+    AssetIDDetails element;
+    walked(element);
+    ++element;
+    EXPECT_FALSE(stands(element));
+}
+
+TEST_F(AssetCursor, ComparesTheVendorOfTheSystem) {
+    AssetIDDetails matching;
+    filter(matching, AssetIDDetails::FILTER_VENDOR, "Example Maker");
+    EXPECT_EQ(walked(matching).size(), 9U);
+    for (const char* vendor : {"EXAMPLE MAKER", "Computer Maker", "Other Maker", "Example Maker ", ""}) {
+        AssetIDDetails element;
+        filter(element, AssetIDDetails::FILTER_VENDOR, vendor);
+        EXPECT_FALSE(stands(element)) << vendor;
+    }
+}
+
+TEST_F(AssetCursor, ComparesTheVersionOfTheProduct) {
+    AssetIDDetails matching;
+    filter(matching, AssetIDDetails::FILTER_VERSION, "4.2.0");
+    EXPECT_EQ(walked(matching).size(), 9U);
+    AssetIDDetails other;
+    filter(other, AssetIDDetails::FILTER_VERSION, "4.2");
+    EXPECT_FALSE(stands(other));
+}
+
+TEST_F(AssetCursor, ComparesTheIdentifyingNumberForTypeZeroAndForTypesWithoutName) {
+    for (const int type : {0, 4, 7, -1}) {
+        AssetIDDetails matching;
+        filter(matching, type, "/system%20one");
+        EXPECT_EQ(walked(matching).size(), 9U) << type;
+        AssetIDDetails other;
+        filter(other, type, "/system one");
+        EXPECT_FALSE(stands(other)) << type;
+    }
+}
+
+TEST_F(AssetCursor, WantsEveryFilterToPass) {
+    AssetIDDetails element;
+    filter(element, AssetIDDetails::FILTER_VENDOR, "Example Maker");
+    filter(element, AssetIDDetails::FILTER_NAME, "dashless");
+    EXPECT_EQ(name(element), "dashless");
+    EXPECT_TRUE(element.evaluate());
+    filter(element, AssetIDDetails::FILTER_VERSION, "another");
+    EXPECT_FALSE(stands(element));
+    EXPECT_FALSE(element.evaluate());
+}
+
+TEST_F(AssetCursor, FiltersFromWhereItStands) {
+    AssetIDDetails element;
+    ++element;
+    ++element;
+    filter(element, AssetIDDetails::FILTER_NAME, "tight");
+    EXPECT_THAT(walked(element), ElementsAre("(none)"));
+}
+
+TEST_F(AssetCursor, GivesTheComputersNameUnderBothNames) {
+    AssetIDDetails element;
+    std::string text;
+    EXPECT_TRUE(element.getCSName(text));
+    EXPECT_EQ(text, "spaced");
+    text.clear();
+    EXPECT_TRUE(element.getName(text));
+    EXPECT_EQ(text, "spaced");
+    while (stands(element)) {
+        ++element;
+    }
+    text = "before";
+    EXPECT_FALSE(element.getCSName(text));
+    EXPECT_FALSE(element.getName(text));
+    EXPECT_EQ(text, "before");
+}
+
+TEST_F(AssetCursor, GivesWhatBelongsToTheSystemAndTheProductForEveryComputer) {
+    AssetIDDetails element;
+    for (; element; ++element) {
+        std::string vendor;
+        EXPECT_TRUE(element.getVendor(vendor));
+        EXPECT_EQ(vendor, "Example Maker");
+        EXPECT_EQ(element.getIdentifyingNumber(), "/system%20one");
+        EXPECT_EQ(element.getVersion(), "4.2.0");
+        EXPECT_EQ(element.getCaption(), "Asset ID Information");
+        EXPECT_EQ(element.getDescription(), "Asset ID Information");
+        EXPECT_EQ(element.getAssetIDStringArea(), 1024U);
+    }
+}
+
+TEST_F(AssetCursor, CutsTheProductNameBeforeTheBlankOfItsFirstDash) {
+    const std::pair<const char*, const char*> cut[] = {
+        {"spaced", "Model X"}, {"tight", "Mode"}, {"many dashes", "Model X"}, {"dash second", ""}};
+    for (const auto& [computer, expected] : cut) {
+        std::string text = "before";
+        EXPECT_TRUE(productName(computer, text));
+        EXPECT_EQ(text, expected) << computer;
+    }
+}
+
+TEST_F(AssetCursor, GivesAProductNameThatBeginsWithADashWhole) {
+    std::string text = "before";
+    EXPECT_TRUE(productName("dash first", text));
+    EXPECT_EQ(text, "-Tower - Red");
+}
+
+TEST_F(AssetCursor, LeavesTheTextAloneForAProductNameWithoutDashAndSaysTrue) {
+    for (const char* computer : {"dashless", "empty"}) {
+        std::string text = "before";
+        EXPECT_TRUE(productName(computer, text));
+        EXPECT_EQ(text, "before");
+    }
+}
+
+TEST_F(AssetCursor, LeavesTheTextAloneWithoutAProductNameAndSaysFalse) {
+    std::string text = "before";
+    EXPECT_FALSE(productName("productless", text));
+    EXPECT_EQ(text, "before");
+}
+
+/** Seconds since 1970 of a CIM datetime text. */
+std::time_t secondsOf(const std::string& text) {
+    std::tm fields{};
+    int micro = 0;
+    char sign = ' ';
+    int offset = 0;
+    EXPECT_EQ(std::sscanf(text.c_str(), "%4d%2d%2d%2d%2d%2d.%6d%c%3d", &fields.tm_year, &fields.tm_mon, &fields.tm_mday,
+                          &fields.tm_hour, &fields.tm_min, &fields.tm_sec, &micro, &sign, &offset),
+              9)
+        << text;
+    fields.tm_year -= 1900;
+    fields.tm_mon -= 1;
+    return timegm(&fields) - (sign == '-' ? -offset : offset) * 60;
+}
+
+TEST_F(AssetCursor, TellsThePresentTime) {
+    const AssetIDDetails element;
+    const std::time_t before = std::time(nullptr);
+    const std::string text = element.getLocalDateTime();
+    const std::time_t after = std::time(nullptr);
+    EXPECT_EQ(text.size(), 25U);
+    EXPECT_GE(secondsOf(text), before);
+    EXPECT_LE(secondsOf(text), after);
+}
+
+}  // namespace

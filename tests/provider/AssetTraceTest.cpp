@@ -1,0 +1,146 @@
+// What the asset element tells of its work, and that it waits for the file lock.
+
+#include "AssetSupport.h"
+#include "KO/Mutex.h"
+
+#include <gmock/gmock.h>
+
+#include <atomic>
+#include <thread>
+
+namespace {
+
+using namespace providerTest;
+using testing::Contains;
+using testing::ElementsAre;
+
+constexpr const char* source = "AssetIDDetails.cpp";
+
+using AssetTrace = AssetFile;
+
+TEST_F(AssetTrace, TellsOfTheFileItFinds) {
+    const AssetIDDetails element;
+    EXPECT_THAT(textsOf(source, "getFileName"),
+                ElementsAre(entering("getFileName", source),
+                            message("Asset.dat file opened in write mode Successfully", source),
+                            exiting("getFileName", source)));
+}
+
+TEST_F(AssetTrace, TellsWhatItReads) {
+    write(path(),
+          "USER.AssetNumber=A-1\nUSER.AssetIdTag=TAG\nUSER.Name=Anna\nUSER.Phone=1\nUSER.Position=P\n"
+          "USER.Department=D\nUSER.Location=L\nUSER.ZOPMProfile=Z\nUSER.PersonalizedLabel2=two\n");
+    const AssetIDDetails element;
+    std::vector<std::string> expected = {
+        entering("AssetIDDetails", source),          message("Opening File", source),
+        message("File Locked successfully", source), message("File Open successfully", source),
+        variable("_AssetNumber", "A-1", source),     variable("_AssetIdTag", "TAG", source),
+        variable("_OwnerName", "Anna", source),      variable("_OwnerPhone", "1", source),
+        variable("_OwnerPosition", "P", source),     variable("_OwnerDepartment", "D", source),
+        variable("_SystemLocation", "L", source),    variable("_ZOPMProfile", "Z", source),
+    };
+    for (const char* label : {"Null", "two", "Null", "Null", "Null"}) {
+        expected.push_back(variable("label", label, source));
+        expected.push_back(variable("data", "Null", source));
+    }
+    expected.push_back(exiting("AssetIDDetails", source));
+    EXPECT_EQ(textsOf(source, "AssetIDDetails"), expected);
+    for (const LogRecord& record : agentEnvironment::log()) {
+        EXPECT_EQ(record.level, 4000);
+        EXPECT_EQ(record.logger, "Tarvik.LeaseWarrantyProvider");
+    }
+    EXPECT_EQ(texts("log"), texts("trace"));
+}
+
+TEST_F(AssetTrace, AsksForTheFileBeforeItTellsOfItsMaking) {
+    const AssetIDDetails element;
+    const auto lines = texts();
+    ASSERT_GT(lines.size(), 4U);
+    EXPECT_EQ(lines[0], entering("getFileName", source));
+    EXPECT_EQ(lines[2], exiting("getFileName", source));
+    EXPECT_EQ(lines[3], entering("AssetIDDetails", source));
+}
+
+TEST_F(AssetTrace, TellsOfAFilterAtErrorLevel) {
+    AssetIDDetails element;
+    agentEnvironment::forgetLog();
+    element.setFilter(AssetIDDetails::FILTER_NAME, "tight");
+    EXPECT_THAT(textsOf(source, "setFilter"),
+                ElementsAre(entering("setFilter", source, " filterType=1 reference=tight"),
+                            exiting("setFilter", source, " filterType=1 reference=tight")));
+    for (const LogRecord& record : recordsOf(source, "setFilter")) {
+        EXPECT_EQ(record.level, 3000);
+    }
+    for (const LogRecord& record : recordsOf(source, "evaluate")) {
+        EXPECT_EQ(record.level, 4000);
+    }
+}
+
+TEST_F(AssetTrace, TellsEntryAndExitOfItsOperations) {
+    AssetIDDetails element;
+    agentEnvironment::forgetLog();
+    EXPECT_TRUE(stands(element));
+    ++element;
+    std::string text;
+    element.getAssetNumber(text);
+    element.getDeploymentUpdateTime(text);
+    element.setSystemPurchaseDate(someDate);
+    element.setOwnerPhone("1");
+    element.setPersonalizedData({});
+    element.flushAssetData();
+    element.getAssetIDStringArea();
+    std::vector<std::string> expected;
+    for (const char* function :
+         {"operator bool", "operator++", "getAssetNumber", "getDeploymentUpdateTime", "setSystemPurchaseDate",
+          "setOwnerPhone", "setPersonalizedData", "flushAssetData", "getAssetIDStringArea"}) {
+        expected.push_back(entering(function, source));
+        expected.push_back(exiting(function, source));
+    }
+    EXPECT_EQ(texts(), expected);
+}
+
+/** Waits until a function of the unit has told of its entry. */
+void awaitEntry(const std::string& function) {
+    while (textsOf(source, function).empty()) {
+        std::this_thread::yield();
+    }
+}
+
+using AssetLock = AssetFile;
+
+TEST_F(AssetLock, KeepsAnotherThreadFromCreatingTheFile) {
+    KO::_fileMutex.lock(withoutLimit);
+    std::atomic<bool> made{false};
+    std::thread other([&] {
+        const AssetIDDetails element;
+        made = true;
+    });
+    awaitEntry("getFileName");
+    EXPECT_FALSE(made);
+    EXPECT_FALSE(std::filesystem::exists(path()));
+    KO::_fileMutex.unlock();
+    other.join();
+    EXPECT_TRUE(made);
+    EXPECT_TRUE(std::filesystem::exists(path()));
+}
+
+TEST_F(AssetLock, KeepsAnotherThreadFromWritingTheFile) {
+    AssetIDDetails element;
+    element.setOwnerName("Anna");
+    agentEnvironment::forgetLog();
+    KO::_fileMutex.lock(withoutLimit);
+    std::atomic<bool> written{false};
+    std::thread other([&] {
+        element.flushAssetData();
+        written = true;
+    });
+    awaitEntry("flushAssetData");
+    EXPECT_FALSE(written);
+    EXPECT_EQ(file(), "");
+    KO::_fileMutex.unlock();
+    other.join();
+    EXPECT_TRUE(written);
+    EXPECT_EQ(valueOf(AssetIDDetails(), textGetters[2]), "Anna");
+}
+
+}  // namespace

@@ -1,0 +1,130 @@
+// What the elements over record stores tell of their work.
+
+#include "ElementSides.h"
+
+#include <gmock/gmock.h>
+
+namespace {
+
+using namespace providerTest;
+using testing::Contains;
+using testing::ElementsAre;
+
+template <class Side>
+class ElementTrace : public RecordStore<typename Side::Store> {
+protected:
+    static std::string source() { return Side::sourceFile; }
+    static std::string named(const std::string& before) { return before + Side::Store::name; }
+
+    /** What a function tells during an operation, and that all of it is of the unit's logger at flow level. */
+    template <class Operation>
+    static std::vector<std::string> told(const std::string& function, Operation operation) {
+        agentEnvironment::forgetLog();
+        operation();
+        for (const LogRecord& record : recordsOf(source(), function)) {
+            EXPECT_EQ(record.logger, "Tarvik.LeaseAndWarrantyProvider");
+            EXPECT_EQ(record.level, 4000);
+        }
+        return textsOf(source(), function);
+    }
+
+    static std::vector<std::string> entryAndExit(const std::string& function, const std::string& list = {}) {
+        return {entering(function, source(), list), exiting(function, source(), list)};
+    }
+};
+
+TYPED_TEST_SUITE(ElementTrace, ElementSides, SideNames);
+
+TYPED_TEST(ElementTrace, TellsOfItsMakingAndEnd) {
+    EXPECT_EQ(this->told(this->named(""), [] { typename TypeParam::Element element; }),
+              this->entryAndExit(this->named("")));
+    EXPECT_EQ(this->told(this->named("~"), [] { typename TypeParam::Element element; }),
+              this->entryAndExit(this->named("~")));
+}
+
+TYPED_TEST(ElementTrace, NamesTheOperators) {
+    this->fill({"A"});
+    typename TypeParam::Element element;
+    EXPECT_EQ(this->told("operator bool", [&] { EXPECT_TRUE(stands(element)); }), this->entryAndExit("operator bool"));
+    EXPECT_EQ(this->told("operator++", [&] { ++element; }), this->entryAndExit("operator++"));
+}
+
+TYPED_TEST(ElementTrace, TellsTypeAndReferenceOfAFilter) {
+    this->fill({"A", "B"});
+    typename TypeParam::Element element;
+    EXPECT_EQ(this->told("setFilter", [&] { element.setFilter(TypeParam::Element::InstanceIDFilter, "B 1"); }),
+              this->entryAndExit("setFilter", " filterType=0 reference=B 1"));
+}
+
+TYPED_TEST(ElementTrace, TellsEachEvaluation) {
+    this->fill({"A", "B"});
+    typename TypeParam::Element element;
+    EXPECT_EQ(this->told("evaluate", [&] { element.setFilter(TypeParam::Element::InstanceIDFilter, "B"); }).size(), 4U);
+}
+
+TYPED_TEST(ElementTrace, NamesCreationRemovalAndGetters) {
+    typename TypeParam::Element element;
+    EXPECT_EQ(this->told(this->named("create"), [&] { TypeParam::create(element, "A"); }),
+              this->entryAndExit(this->named("create"), " instanceId=A"));
+    element.setFilter(TypeParam::Element::InstanceIDFilter, "A");
+    EXPECT_EQ(this->told(this->named("remove"), [&] { TypeParam::remove(element); }),
+              this->entryAndExit(this->named("remove")));
+    std::string text;
+    EXPECT_EQ(this->told("getInstanceID", [&] { element.getInstanceID(text); }), this->entryAndExit("getInstanceID"));
+    EXPECT_EQ(this->told("getElementName", [&] { element.getElementName(text); }),
+              this->entryAndExit("getElementName"));
+    EXPECT_EQ(this->told("getCaption", [&] { element.getCaption(text); }), this->entryAndExit("getCaption"));
+    EXPECT_EQ(this->told("getDescription", [&] { element.getDescription(text); }),
+              this->entryAndExit("getDescription"));
+}
+
+TYPED_TEST(ElementTrace, TellsARemovalWithoutFilterAtErrorLevelAndNoExit) {
+    this->fill({"A"});
+    typename TypeParam::Element element;
+    agentEnvironment::forgetLog();
+    EXPECT_THROW(TypeParam::remove(element), InstrumentationException);
+    const auto records = recordsOf(this->source(), this->named("remove"));
+    ASSERT_EQ(records.size(), 2U);
+    EXPECT_EQ(withoutLine(records[0].text), entering(this->named("remove"), this->source()));
+    EXPECT_EQ(withoutLine(records[1].text),
+              message(std::string("Identify a ") + TypeParam::Store::name + " to remove.", this->source()));
+    EXPECT_EQ(records[1].level, 3000);
+}
+
+TYPED_TEST(ElementTrace, TellsNoExitOfAGetterThatFails) {
+    typename TypeParam::Element element;
+    std::string text;
+    EXPECT_THAT(
+        this->told("getInstanceID", [&] { EXPECT_THROW(element.getInstanceID(text), InstrumentationException); }),
+        ElementsAre(entering("getInstanceID", this->source())));
+}
+
+using LeaseTrace = ElementTrace<LeaseElementSide>;
+using WarrantyTrace = ElementTrace<WarrantyElementSide>;
+
+TEST_F(LeaseTrace, NamesTheAccessorsOfProperties) {
+    fill({"A"});
+    KO::LeaseWarrantyProvider::Lease lease;
+    std::string text;
+    unsigned int number = 0;
+    bool flag = false;
+    EXPECT_EQ(told("getLessor", [&] { lease.getLessor(text); }), entryAndExit("getLessor"));
+    EXPECT_EQ(told("setBaseRent", [&] { lease.setBaseRent("100"); }), entryAndExit("setBaseRent"));
+    EXPECT_EQ(told("getLeaseTerm", [&] { lease.getLeaseTerm(number); }), entryAndExit("getLeaseTerm"));
+    EXPECT_EQ(told("setRenewalOption", [&] { lease.setRenewalOption(true); }), entryAndExit("setRenewalOption"));
+    EXPECT_EQ(told("getBargainRenewalOption", [&] { lease.getBargainRenewalOption(flag); }),
+              entryAndExit("getBargainRenewalOption"));
+}
+
+TEST_F(WarrantyTrace, NamesTheAccessorsOfProperties) {
+    fill({"A"});
+    KO::LeaseWarrantyProvider::Warranty warranty;
+    std::string text;
+    unsigned int number = 0;
+    EXPECT_EQ(told("getWarrantor", [&] { warranty.getWarrantor(text); }), entryAndExit("getWarrantor"));
+    EXPECT_EQ(told("setCommencementDate", [&] { warranty.setCommencementDate("x"); }),
+              entryAndExit("setCommencementDate"));
+    EXPECT_EQ(told("getDuration", [&] { warranty.getDuration(number); }), entryAndExit("getDuration"));
+}
+
+}  // namespace

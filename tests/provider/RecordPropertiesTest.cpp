@@ -1,0 +1,169 @@
+// The named properties of leases and warranties.
+
+#include "ElementSides.h"
+
+namespace {
+
+using namespace providerTest;
+using KO::LeaseWarrantyProvider::Lease;
+using KO::LeaseWarrantyProvider::Warranty;
+
+/** One property: its operations and the member that they reach. */
+template <class Element, class Unit, class Value>
+struct PropertyRow {
+    const char* name;
+    bool (Element::*get)(Value&) const;
+    void (Element::*set)(Value);
+    Value Unit::*member;
+};
+
+template <class Value>
+using LeaseRow = PropertyRow<Lease, LeaseUnit, Value>;
+template <class Value>
+using WarrantyRow = PropertyRow<Warranty, WarrantyUnit, Value>;
+
+const LeaseRow<std::string> leaseTexts[] = {
+    {"Lessor", &Lease::getLessor, &Lease::setLessor, &LeaseUnit::Lessor},
+    {"BaseTermCommencementDate", &Lease::getBaseTermCommencementDate, &Lease::setBaseTermCommencementDate,
+     &LeaseUnit::BaseTermCommencementDate},
+    {"BaseRent", &Lease::getBaseRent, &Lease::setBaseRent, &LeaseUnit::BaseRent},
+    {"FairMarketRental", &Lease::getFairMarketRental, &Lease::setFairMarketRental, &LeaseUnit::FairMarketRental},
+    {"FairMarketValue", &Lease::getFairMarketValue, &Lease::setFairMarketValue, &LeaseUnit::FairMarketValue},
+    {"TerminationValue", &Lease::getTerminationValue, &Lease::setTerminationValue, &LeaseUnit::TerminationValue},
+};
+const LeaseRow<unsigned int> leaseNumbers[] = {
+    {"LeaseTerm", &Lease::getLeaseTerm, &Lease::setLeaseTerm, &LeaseUnit::LeaseTerm},
+    {"NetMonthlyLeaseRateFactor", &Lease::getNetMonthlyLeaseRateFactor, &Lease::setNetMonthlyLeaseRateFactor,
+     &LeaseUnit::NetMonthlyLeaseRateFactor},
+};
+const LeaseRow<bool> leaseFlags[] = {
+    {"EarlyTerminationOption", &Lease::getEarlyTerminationOption, &Lease::setEarlyTerminationOption,
+     &LeaseUnit::EarlyTerminationOption},
+    {"FixedPricePurchaseOption", &Lease::getFixedPricePurchaseOption, &Lease::setFixedPricePurchaseOption,
+     &LeaseUnit::FixedPricePurchaseOption},
+    {"RenewalOption", &Lease::getRenewalOption, &Lease::setRenewalOption, &LeaseUnit::RenewalOption},
+    {"BargainRenewalOption", &Lease::getBargainRenewalOption, &Lease::setBargainRenewalOption,
+     &LeaseUnit::BargainRenewalOption},
+};
+const WarrantyRow<std::string> warrantyTexts[] = {
+    {"Warrantor", &Warranty::getWarrantor, &Warranty::setWarrantor, &WarrantyUnit::Warrantor},
+    {"CommencementDate", &Warranty::getCommencementDate, &Warranty::setCommencementDate,
+     &WarrantyUnit::CommencementDate},
+};
+const WarrantyRow<unsigned int> warrantyNumbers[] = {
+    {"Duration", &Warranty::getDuration, &Warranty::setDuration, &WarrantyUnit::Duration},
+};
+
+template <class Side>
+class RecordProperties : public RecordStore<typename Side::Store> {
+protected:
+    using Element = typename Side::Element;
+    using Unit = typename Side::Store::Unit;
+
+    /** The property is set, alone, in the current record, and comes back; at the end both refuse. */
+    template <class Value>
+    void expectProperty(const PropertyRow<Element, Unit, Value>& row, const Value& stored) {
+        SCOPED_TRACE(row.name);
+        this->emptyTable();
+        this->fill({"before", "current"});
+        Unit expected("current");
+        expected.*row.member = stored;
+        Element element;
+        element.setFilter(Element::InstanceIDFilter, "current");
+        (element.*row.set)(stored);
+        EXPECT_EQ(Side::Store::members(this->table()[1]), Side::Store::members(expected));
+        const Unit untouched("before");
+        EXPECT_EQ(Side::Store::members(this->table()[0]), Side::Store::members(untouched));
+        Value value{};
+        EXPECT_TRUE((element.*row.get)(value));
+        EXPECT_EQ(value, stored);
+        ++element;
+        const auto notAvailable = Words<typename Side::Store>::notAvailable;
+        EXPECT_EQ(thrown<InstrumentationException>([&] { (element.*row.get)(value); }), notAvailable);
+        EXPECT_EQ(thrown<InstrumentationException>([&] { (element.*row.set)(stored); }), notAvailable);
+    }
+};
+
+using LeaseProperties = RecordProperties<LeaseElementSide>;
+using WarrantyProperties = RecordProperties<WarrantyElementSide>;
+
+TEST_F(LeaseProperties, AreReachedByTheirOwnOperations) {
+    for (const auto& row : leaseTexts) {
+        expectProperty(row, std::string("some text"));
+    }
+    for (const auto& row : leaseNumbers) {
+        expectProperty(row, 4294967295U);
+    }
+    for (const auto& row : leaseFlags) {
+        expectProperty(row, true);
+    }
+}
+
+TEST_F(WarrantyProperties, AreReachedByTheirOwnOperations) {
+    for (const auto& row : warrantyTexts) {
+        expectProperty(row, std::string("some text"));
+    }
+    for (const auto& row : warrantyNumbers) {
+        expectProperty(row, 4294967295U);
+    }
+}
+
+TEST_F(LeaseProperties, ComeBackFromTheFile) {
+    fill({"lease 1"});
+    {
+        Lease lease;
+        for (const auto& row : leaseTexts) {
+            (lease.*row.set)(std::string("long-enough-for-a-date-of-") + row.name);
+        }
+        for (const auto& row : leaseNumbers) {
+            (lease.*row.set)(36);
+        }
+        for (const auto& row : leaseFlags) {
+            (lease.*row.set)(true);
+        }
+    }
+    const LeaseCache reloaded;
+    const LeaseUnit& unit = reloaded.table.at(0);
+    EXPECT_EQ(LeaseSide::members(unit), LeaseSide::members(table().at(0)));
+    for (const auto& row : leaseTexts) {
+        EXPECT_EQ(unit.*row.member, std::string("long-enough-for-a-date-of-") + row.name);
+    }
+}
+
+template <class Side>
+class CommonProperties : public RecordProperties<Side> {};
+
+TYPED_TEST_SUITE(CommonProperties, ElementSides, SideNames);
+
+TYPED_TEST(CommonProperties, HaveAnElementName) {
+    const typename TypeParam::Element element;
+    std::string text = "before";
+    EXPECT_TRUE(element.getElementName(text));
+    EXPECT_EQ(text, std::string(TypeParam::Store::name) + " Information");
+}
+
+TYPED_TEST(CommonProperties, HaveNoneOfTheOthersAndLeaveTheirOutputAlone) {
+    this->fill({"A"});
+    const typename TypeParam::Element element;
+    std::string text = "before";
+    unsigned short type = 7;
+    EXPECT_FALSE(element.getCaption(text));
+    EXPECT_FALSE(element.getDescription(text));
+    EXPECT_FALSE(element.getConfigurationName(text));
+    EXPECT_FALSE(element.getChangeableType(type));
+    EXPECT_EQ(text, "before");
+    EXPECT_EQ(type, 7);
+}
+
+TYPED_TEST(CommonProperties, HaveTheIdentifier) {
+    this->fill({"lease 1"});
+    typename TypeParam::Element element;
+    std::string text;
+    EXPECT_TRUE(element.getInstanceID(text));
+    EXPECT_EQ(text, "lease 1");
+    ++element;
+    EXPECT_EQ(thrown<InstrumentationException>([&] { element.getInstanceID(text); }),
+              Words<typename TypeParam::Store>::notAvailable);
+}
+
+}  // namespace

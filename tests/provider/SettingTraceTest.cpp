@@ -1,0 +1,116 @@
+// What the setting elements tell of their work.
+
+#include "SettingSides.h"
+
+#include <gmock/gmock.h>
+
+#include <sstream>
+
+namespace {
+
+using namespace providerTest;
+using testing::ElementsAre;
+using testing::ElementsAreArray;
+
+/** Level and text of a record. */
+struct Told {
+    int level;
+    std::string text;
+    bool operator==(const Told& other) const { return level == other.level && text == other.text; }
+    friend std::ostream& operator<<(std::ostream& stream, const Told& told) {
+        return stream << told.level << ' ' << told.text;
+    }
+};
+
+template <class Side>
+class SettingTrace : public SettingElement<Side> {
+protected:
+    /** What a function of the unit told, all of it under the unit's logger. */
+    static std::vector<Told> told(const std::string& function) {
+        std::vector<Told> found;
+        for (const LogRecord& record : recordsOf(Side::sourceFile, function)) {
+            EXPECT_EQ(record.logger, "Tarvik.LeaseAndWarrantyProvider");
+            found.push_back({record.level, withoutLine(record.text)});
+        }
+        return found;
+    }
+
+    static std::string listOf(const std::string& label, const Moniker& argument) {
+        std::ostringstream list;
+        list << label << &argument;
+        return list.str();
+    }
+};
+
+TYPED_TEST_SUITE(SettingTrace, SettingSides, SideNames);
+
+TYPED_TEST(SettingTrace, NotesItsMakingAndItsEnd) {
+    agentEnvironment::forgetLog();
+    { typename TypeParam::Setting fresh; }
+    for (const char* before : {"", "~"}) {
+        const std::string function = std::string(before) + TypeParam::name;
+        EXPECT_THAT(textsOf(TypeParam::sourceFile, function),
+                    ElementsAre("METHOD: " + function + "() was invoked in " + TypeParam::sourceFile + " [Line: N]"));
+        EXPECT_EQ(recordsOf(TypeParam::sourceFile, function).at(0).level, 4000);
+    }
+}
+
+TYPED_TEST(SettingTrace, TellsOfTheWayToTheElement) {
+    Moniker argument = moniker({{"Name", "beta"}});
+    const std::string list = this->listOf(" monikerComputer=", argument);
+    agentEnvironment::forgetLog();
+    TypeParam::elementMoniker(this->setting, argument);
+    std::vector<Told> expected = {
+        {3000, entering(TypeParam::toElement, TypeParam::sourceFile, list)},
+        {4000, variable("Name", "beta", TypeParam::sourceFile)},
+        {4000, variable("InstanceID", "/system/second%5Fbox", TypeParam::sourceFile)},
+    };
+    if (TypeParam::marksExitToElement) {
+        expected.push_back({3000, exiting(TypeParam::toElement, TypeParam::sourceFile, list)});
+    }
+    EXPECT_THAT(this->told(TypeParam::toElement), ElementsAreArray(expected));
+}
+
+TYPED_TEST(SettingTrace, TellsOfTheWayToTheComputer) {
+    Moniker argument = moniker({{"InstanceID", "/system/third"}});
+    const std::string list = this->listOf(TypeParam::elementLabel, argument);
+    agentEnvironment::forgetLog();
+    this->setting.getComputerMoniker(argument);
+    EXPECT_THAT(this->told("getComputerMoniker"),
+                ElementsAre(Told{3000, entering("getComputerMoniker", TypeParam::sourceFile, list)},
+                            Told{4000, variable("Name", "beta", TypeParam::sourceFile)},
+                            Told{3000, exiting("getComputerMoniker", TypeParam::sourceFile, list)}));
+}
+
+TYPED_TEST(SettingTrace, ShowsTheElementsFilterSetToTheIdentifier) {
+    agentEnvironment::forgetLog();
+    this->toElement({{"Name", "beta"}});
+    const std::string list = " filterType=0 reference=/system/second%5Fbox";
+    EXPECT_THAT(textsOf(TypeParam::elementFile, "setFilter"),
+                ElementsAre(entering("setFilter", TypeParam::elementFile, list),
+                            exiting("setFilter", TypeParam::elementFile, list)));
+}
+
+TYPED_TEST(SettingTrace, ShowsTheFilterSetToTheTextOfNoNodeForAnUnknownComputer) {
+    agentEnvironment::forgetLog();
+    this->toElement({{"Name", "gamma"}});
+    EXPECT_EQ(textsOf(TypeParam::elementFile, "setFilter").at(0),
+              entering("setFilter", TypeParam::elementFile, " filterType=0 reference="));
+}
+
+TYPED_TEST(SettingTrace, TellsFailuresAtErrorLevelAndNoExit) {
+    agentEnvironment::forgetLog();
+    Moniker empty;
+    EXPECT_THROW(TypeParam::elementMoniker(this->setting, empty), FrameworkException);
+    EXPECT_THROW(this->setting.getComputerMoniker(empty), FrameworkException);
+    EXPECT_THAT(this->told(TypeParam::toElement),
+                ElementsAre(Told{3000, entering(TypeParam::toElement, TypeParam::sourceFile,
+                                                this->listOf(" monikerComputer=", empty))},
+                            Told{3000, message("Could not find 'Name' Key in Moniker", TypeParam::sourceFile)}));
+    EXPECT_THAT(this->told("getComputerMoniker"),
+                ElementsAre(Told{3000, entering("getComputerMoniker", TypeParam::sourceFile,
+                                                this->listOf(TypeParam::elementLabel, empty))},
+                            Told{3000, message("Could not find 'InstanceID' Key in Moniker", TypeParam::sourceFile)}));
+}
+
+}  // namespace

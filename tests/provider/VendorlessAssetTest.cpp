@@ -1,0 +1,46 @@
+// A system without a vendor: what cannot be read counts as passed.
+
+#include "AssetSupport.h"
+
+const char* const agentNodes = R"(
+[[instrumentation.node]]
+type = 1
+path = "/system"
+properties = { "108" = "the system" }
+
+[[instrumentation.node]]
+type = 40
+path = "/system/computer"
+properties = { "36" = "Computer Maker", "39" = "Model X - Tower", "108" = "testhost" }
+)";
+
+namespace {
+
+using namespace providerTest;
+
+using VendorlessAsset = AssetFile;
+
+TEST_F(VendorlessAsset, PassesEveryVendorFilter) {
+    for (const char* vendor : {"Computer Maker", "anybody", ""}) {
+        AssetIDDetails element;
+        element.setFilter(AssetIDDetails::FILTER_VENDOR, vendor);
+        EXPECT_TRUE(stands(element)) << vendor;
+        EXPECT_TRUE(element.evaluate());
+    }
+}
+
+TEST_F(VendorlessAsset, StillFailsAnotherFilter) {
+    AssetIDDetails element;
+    element.setFilter(AssetIDDetails::FILTER_VENDOR, "anybody");
+    element.setFilter(AssetIDDetails::FILTER_NAME, "otherhost");
+    EXPECT_FALSE(stands(element));
+}
+
+TEST_F(VendorlessAsset, HasNoVendorAndLeavesTheTextAlone) {
+    const AssetIDDetails element;
+    std::string text = "before";
+    EXPECT_FALSE(element.getVendor(text));
+    EXPECT_EQ(text, "before");
+}
+
+}  // namespace
