@@ -6,13 +6,13 @@ namespace {
 
 /** What a first byte announces. */
 struct Form {
-    unsigned char mask;   ///< bits of the first byte that tell the form
-    unsigned char value;  ///< and what they must be
     std::size_t length;
     std::uint32_t least;  ///< the smallest code point that needs this length
+    unsigned char mask;   ///< bits of the first byte that tell the form
+    unsigned char value;  ///< and what they must be
 };
 
-constexpr Form forms[] = {{0x80, 0x00, 1, 0}, {0xE0, 0xC0, 2, 0x80}, {0xF0, 0xE0, 3, 0x800}, {0xF8, 0xF0, 4, 0x10000}};
+constexpr Form forms[] = {{1, 0, 0x80, 0x00}, {2, 0x80, 0xE0, 0xC0}, {3, 0x800, 0xF0, 0xE0}, {4, 0x10000, 0xF8, 0xF0}};
 
 const Form* formOf(unsigned char first) {
     for (const Form& form : forms) {

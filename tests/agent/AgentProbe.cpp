@@ -33,6 +33,7 @@ void log(int level, const std::string& logger, const std::string& text) {
 /** probe many THREADS RECORDS: numbered records from several threads at a time. */
 void logMany(int threadCount, int recordCount) {
     std::vector<std::thread> threads;
+    threads.reserve(static_cast<std::size_t>(threadCount));
     for (int number = 0; number < threadCount; ++number) {
         threads.emplace_back([number, recordCount] {
             for (int record = 0; record < recordCount; ++record) {

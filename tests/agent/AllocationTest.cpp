@@ -46,8 +46,8 @@ TEST_F(Allocation, IsNotNeededForARecordThatIsNotAdmitted) {
     const std::string logger = "a name that does not fit into a string object";
     const std::string text = "a text that does not fit into a string object either";
     const auto log = [&] {
-        RZLog::RZLogger::logLevelMessage(__func__, __FILE__, __LINE__, logger, 4000, nullptr, 0, 0, text);
-        RZLog::RZLogger::traceLevelMessage(__func__, __FILE__, __LINE__, logger, 6000, nullptr, 0, 0, text);
+        RZLog::RZLogger::logLevelMessage("log", "AllocationTest.cpp", 1, logger, 4000, nullptr, 0, 0, text);
+        RZLog::RZLogger::traceLevelMessage("log", "AllocationTest.cpp", 1, logger, 6000, nullptr, 0, 0, text);
     };
     log();  // reads the configuration
     const long before = allocations;
