@@ -1,7 +1,7 @@
 #pragma once
 
 #include "CMPILease.h"
-#include "ClassIds.h"
+#include "KO/ClassIds.h"
 #include "LeaseSetting.h"
 #include "SettingAdapter.h"
 

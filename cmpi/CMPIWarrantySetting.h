@@ -1,7 +1,7 @@
 #pragma once
 
 #include "CMPIWarranty.h"
-#include "ClassIds.h"
+#include "KO/ClassIds.h"
 #include "SettingAdapter.h"
 #include "WarrantySetting.h"
 

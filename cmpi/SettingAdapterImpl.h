@@ -3,7 +3,7 @@
 // Definitions of SettingAdapter. Included by the source file of each adapter and nowhere else, so that
 // each adapter's code and trace buffers stand in its own unit.
 
-#include "ClassIds.h"
+#include "KO/ClassIds.h"
 #include "KO/Moniker.h"
 #include "KO/ProviderUtilities.h"
 #include "SettingAdapter.h"

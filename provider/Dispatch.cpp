@@ -7,7 +7,7 @@
 #include "CMPIOstrelAgent.h"
 #include "CMPIWarranty.h"
 #include "CMPIWarrantySetting.h"
-#include "ClassIds.h"
+#include "KO/ClassIds.h"
 
 #include <algorithm>
 #include <array>

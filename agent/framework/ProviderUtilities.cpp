@@ -1,5 +1,6 @@
 #include "KO/ProviderUtilities.h"
 
+#include "KO/ClassIds.h"
 #include "KO/Moniker.h"
 #include "framework/AsciiCase.h"
 #include "framework/CimDateTime.h"
@@ -11,15 +12,19 @@ namespace KO {
 
 namespace {
 
-struct ClassId {
+struct ClassEntry {
     const char* className;
     unsigned short id;
 };
 
-constexpr ClassId classIds[] = {
-    {"VELKO_ComputerSystem", 1},   {"VELKO_Lease", 20},           {"VELKO_Warranty", 21},
-    {"VELKO_LeaseSetting", 25},    {"VELKO_WarrantySetting", 32}, {"VELKO_OstrelAgent", 208},
-    {"VELKO_AssetIDDetails", 209},
+constexpr ClassEntry classIds[] = {
+    {"VELKO_ComputerSystem", ClassId::computerSystem},
+    {"VELKO_Lease", ClassId::lease},
+    {"VELKO_Warranty", ClassId::warranty},
+    {"VELKO_LeaseSetting", ClassId::leaseSetting},
+    {"VELKO_WarrantySetting", ClassId::warrantySetting},
+    {"VELKO_OstrelAgent", ClassId::ostrelAgent},
+    {"VELKO_AssetIDDetails", ClassId::assetIDDetails},
 };
 
 /** By the convention of CMPI, a value of type CMPI_chars is the characters themselves. */
@@ -69,18 +74,18 @@ bool deliver(std::optional<Value> found, Value& value) {
 unsigned short ProviderUtilities::getClassId(const CMPIObjectPath* path) {
     CMPIStatus status{};
     const std::optional<std::string> name = textOf(callTable<&CMPIObjectPathFT::getClassName>(path, &status));
-    return name ? getClassId(name->c_str()) : static_cast<unsigned short>(0);
+    return name ? getClassId(name->c_str()) : ClassId::unknown;
 }
 
 unsigned short ProviderUtilities::getClassId(const char* className) {
     if (className != nullptr) {
-        for (const ClassId& entry : classIds) {
+        for (const ClassEntry& entry : classIds) {
             if (equalIgnoringCase(entry.className, className)) {
                 return entry.id;
             }
         }
     }
-    return 0;
+    return ClassId::unknown;
 }
 
 std::string ProviderUtilities::getNamespace(const CMPIObjectPath* path) {

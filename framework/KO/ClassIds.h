@@ -1,9 +1,10 @@
 #pragma once
 
-/** The numbers by which the agent framework knows the CIM classes that concern the provider. */
-namespace KO::LeaseWarrantyProvider::ClassId {
+/** The numbers by which the agent framework knows CIM classes, as ProviderUtilities::getClassId gives them. */
+namespace KO::ClassId {
 
-constexpr unsigned short computerSystem = 1;  ///< served by another provider
+constexpr unsigned short unknown = 0;
+constexpr unsigned short computerSystem = 1;
 constexpr unsigned short lease = 20;
 constexpr unsigned short warranty = 21;
 constexpr unsigned short leaseSetting = 25;
@@ -11,4 +12,4 @@ constexpr unsigned short warrantySetting = 32;
 constexpr unsigned short ostrelAgent = 208;
 constexpr unsigned short assetIDDetails = 209;
 
-}  // namespace KO::LeaseWarrantyProvider::ClassId
+}  // namespace KO::ClassId
