@@ -139,8 +139,8 @@ CMPIString* toString(const CMPIBroker* broker, const void* object, CMPIStatus* r
 
 CMPIBoolean isOfType(const CMPIBroker* broker, const void* object, const char* type, CMPIStatus* rc) {
     return guarded<CMPIBoolean>(rc, 0, [&] {
-        const bool matches = argument(type) == typeText(anyObject(broker, object).kind());
-        return static_cast<CMPIBoolean>(matches ? 1 : 0);
+        const std::string actual = typeText(anyObject(broker, object).kind());
+        return static_cast<CMPIBoolean>(argument(type) == actual ? 1 : 0);
     });
 }
 
@@ -204,7 +204,7 @@ CMPIStatus openMessageFile(const CMPIBroker* broker, const char*, CMPIMsgFileHan
     });
 }
 
-CMPIStatus closeMessageFile(const CMPIBroker* broker, const CMPIMsgFileHandle file) {
+CMPIStatus closeMessageFile(const CMPIBroker* broker, CMPIMsgFileHandle file) {
     return guarded([&] {
         Broker::of(broker);
         if (file != nullptr) {

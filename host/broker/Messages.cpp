@@ -11,29 +11,41 @@ namespace {
 
 constexpr CMPICount mostInserts = 10;
 
-/** The next insert of the list as text. Failure with CMPI_RC_ERR_TYPE_MISMATCH for any other type. */
-std::string nextInsert(va_list inserts) {
-    switch (va_arg(inserts, int)) {
-        case CMPI_sint32:
-            return std::to_string(va_arg(inserts, CMPISint32));
-        case CMPI_uint32:
-            return std::to_string(va_arg(inserts, CMPIUint32));
-        case CMPI_sint64:
-            return std::to_string(va_arg(inserts, CMPISint64));
-        case CMPI_uint64:
-            return std::to_string(va_arg(inserts, CMPIUint64));
-        case CMPI_real64:
-            return std::to_string(va_arg(inserts, CMPIReal64));
-        case CMPI_boolean:
-            return va_arg(inserts, int) != 0 ? "true" : "false";
-        case CMPI_chars:
-            return argument(va_arg(inserts, const char*));
-        case CMPI_string:
-            return argument(va_arg(inserts, const CMPIString*));
-        default:
-            throw Failure(CMPI_RC_ERR_TYPE_MISMATCH);
+/** The inserts of a message, read one after the other. */
+class Inserts {
+public:
+    explicit Inserts(va_list itsList) { va_copy(list, itsList); }
+    ~Inserts() { va_end(list); }
+    Inserts(const Inserts&) = delete;
+    Inserts& operator=(const Inserts&) = delete;
+
+    /** The next one as text. Failure with CMPI_RC_ERR_TYPE_MISMATCH for a type that is none of an insert's. */
+    std::string next() {
+        switch (va_arg(list, int)) {
+            case CMPI_sint32:
+                return std::to_string(va_arg(list, CMPISint32));
+            case CMPI_uint32:
+                return std::to_string(va_arg(list, CMPIUint32));
+            case CMPI_sint64:
+                return std::to_string(va_arg(list, CMPISint64));
+            case CMPI_uint64:
+                return std::to_string(va_arg(list, CMPIUint64));
+            case CMPI_real64:
+                return std::to_string(va_arg(list, CMPIReal64));
+            case CMPI_boolean:
+                return va_arg(list, int) != 0 ? "true" : "false";
+            case CMPI_chars:
+                return argument(va_arg(list, const char*));
+            case CMPI_string:
+                return argument(va_arg(list, const CMPIString*));
+            default:
+                throw Failure(CMPI_RC_ERR_TYPE_MISMATCH);
+        }
     }
-}
+
+private:
+    va_list list;
+};
 
 /** The template with its inserts; triggers without an insert stay. */
 std::string expanded(const std::string& text, const std::vector<std::string>& inserts) {
@@ -56,9 +68,10 @@ std::string message(const char* text, CMPICount count, va_list list) {
     if (count > mostInserts) {
         throw Failure(CMPI_RC_ERR_INVALID_PARAMETER);
     }
+    Inserts given(list);
     std::vector<std::string> inserts;
     while (inserts.size() < count) {
-        inserts.push_back(nextInsert(list));
+        inserts.push_back(given.next());
     }
     return expanded(unexpanded, inserts);
 }
@@ -84,7 +97,7 @@ CMPIString* getMessage(const CMPIBroker* broker, const char*, const char* defaul
     return result;
 }
 
-CMPIString* getMessage2(const CMPIBroker* broker, const char*, const CMPIMsgFileHandle, const char* defaultTemplate,
+CMPIString* getMessage2(const CMPIBroker* broker, const char*, CMPIMsgFileHandle, const char* defaultTemplate,
                         CMPIStatus* rc, CMPICount count, ...) {
     va_list list;
     va_start(list, count);

@@ -1,6 +1,8 @@
 #include "operations/ProviderPool.h"
 
+#include <tuple>
 #include <type_traits>
+#include <utility>
 
 #include "operations/LibraryError.h"
 
@@ -29,6 +31,10 @@ ProviderPool::~ProviderPool() {
         end(provider, provider.instance);
         end(provider, provider.association);
     }
+}
+
+bool ProviderPool::AddressLess::operator()(const ProviderAddress& left, const ProviderAddress& right) const {
+    return std::tie(left.location, left.provider) < std::tie(right.location, right.provider);
 }
 
 template <class Interface>
@@ -62,7 +68,7 @@ LoadedLibrary& ProviderPool::library(const std::string& location) {
 template <class Interface>
 Interface* ProviderPool::get(const ProviderAddress& address) {
     const std::lock_guard<std::recursive_mutex> lock(mutex);
-    Provider& provider = providers[{address.location, address.provider}];
+    Provider& provider = providers[address];
     Interface*& interface = member<Interface>(provider);
     if (interface == nullptr) {
         if (provider.isStarting) {

@@ -4,7 +4,6 @@
 #include <memory>
 #include <mutex>
 #include <string>
-#include <utility>
 
 #include "operations/Interfaces.h"
 #include "operations/LoadedLibrary.h"
@@ -37,6 +36,11 @@ private:
         bool isStarting = false;  ///< a factory is running
     };
 
+    /** Some order of addresses. */
+    struct AddressLess {
+        bool operator()(const ProviderAddress& left, const ProviderAddress& right) const;
+    };
+
     template <class Interface>
     static Interface*& member(Provider& provider);
 
@@ -48,8 +52,8 @@ private:
     Broker& broker;
     LibraryOptions options;
     std::recursive_mutex mutex;  ///< recursive: a factory may make a request that needs another provider
-    std::map<std::string, std::unique_ptr<LoadedLibrary>> libraries;    ///< by location
-    std::map<std::pair<std::string, std::string>, Provider> providers;  ///< by location and name
+    std::map<std::string, std::unique_ptr<LoadedLibrary>> libraries;  ///< by location
+    std::map<ProviderAddress, Provider, AddressLess> providers;
 };
 
 }  // namespace cimhost

@@ -49,8 +49,8 @@ CMPIString* getMessage(const CMPIBroker* broker, const char* id, const char* tex
     return message;
 }
 
-CMPIString* getMessage2(const CMPIBroker* broker, const char* id, const CMPIMsgFileHandle, const char* text,
-                        CMPIStatus* rc, CMPICount count, ...) {
+CMPIString* getMessage2(const CMPIBroker* broker, const char* id, CMPIMsgFileHandle, const char* text, CMPIStatus* rc,
+                        CMPICount count, ...) {
     va_list inserts;
     va_start(inserts, count);
     CMPIString* message = recordMessage(getMessage2Name, broker, id, text, rc, count, inserts);
