@@ -2,6 +2,8 @@
 
 #include <gtest/gtest.h>
 
+#include <ostream>
+
 using Agent::firstCharacter;
 using Agent::Utf8Character;
 
@@ -14,6 +16,10 @@ struct Case {
     std::size_t length;
     bool valid;
 };
+
+std::ostream& operator<<(std::ostream& stream, const Case& one) {
+    return stream << one.description;
+}
 
 class Utf8Decoding : public testing::TestWithParam<Case> {};
 
