@@ -81,10 +81,10 @@ std::string answerText(const RawAnswer& answer) {
 Row providerRow(const ListedClass& listed, const ProviderRegistration& provider) {
     std::vector<std::string> interfaces;
     if (provider.instance) {
-        interfaces.push_back("instance");
+        interfaces.emplace_back("instance");
     }
     if (provider.association) {
-        interfaces.push_back("association");
+        interfaces.emplace_back("association");
     }
     return {listed.name, joined(interfaces, ","), provider.provider, "lib" + provider.location + ".so",
             joined(provider.nameSpaces, ",") + (listed.definition == nullptr ? "  (not in the schema)" : "")};

@@ -23,6 +23,7 @@ std::string contentOf(const std::filesystem::path& file) {
 /** The arrays that exec wants, ended by a null pointer. */
 std::vector<char*> pointersTo(std::vector<std::string>& texts) {
     std::vector<char*> pointers;
+    pointers.reserve(texts.size() + 1);
     for (std::string& text : texts) {
         pointers.push_back(text.data());
     }

@@ -1,11 +1,9 @@
-#include <gmock/gmock.h>
+#include <gtest/gtest.h>
 
 #include "host/schema/Schemas.h"
 
 namespace cimhost::test {
 namespace {
-
-using testing::HasSubstr;
 
 Value defaultOf(const std::string& declaration) {
     const Schema schema = schemaOf("class C { " + declaration + " };");
