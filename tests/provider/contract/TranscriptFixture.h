@@ -40,7 +40,7 @@ protected:
     void forEachTranscript(Check check) {
         for (const Scenario& scenario : scenarios()) {
             SCOPED_TRACE(scenario.name);
-            const auto records = transcriptOf(scenario);
+            const auto& records = recordsOf(scenario);
             ASSERT_THAT(records, testing::Not(testing::IsEmpty()));
             check(scenario, records);
         }
@@ -55,6 +55,9 @@ protected:
             }
         });
     }
+
+    /** What a scenario logs; it is run once in the process. */
+    const std::vector<LogRecord>& recordsOf(const Scenario& scenario);
 
     /** The log channel's records of the scenario of that name. */
     std::vector<LogRecord> logged(const std::string& scenarioName);
