@@ -14,8 +14,8 @@ namespace cimhost {
 ///@{
 CMPIString* getMessage(const CMPIBroker* broker, const char* id, const char* defaultTemplate, CMPIStatus* rc,
                        CMPICount count, ...);
-CMPIString* getMessage2(const CMPIBroker* broker, const char* id, CMPIMsgFileHandle file,
-                        const char* defaultTemplate, CMPIStatus* rc, CMPICount count, ...);
+CMPIString* getMessage2(const CMPIBroker* broker, const char* id, CMPIMsgFileHandle file, const char* defaultTemplate,
+                        CMPIStatus* rc, CMPICount count, ...);
 
 /** Both of them, with the inserts as a list. */
 CMPIString* messageFromList(const CMPIBroker* broker, const char* defaultTemplate, CMPIStatus* rc, CMPICount count,

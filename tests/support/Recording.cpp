@@ -41,13 +41,13 @@ void Recording::order(const std::string& function, std::optional<int> number, Ve
     requireFunction(function);
     const std::lock_guard<std::mutex> lock(mutex);
     const std::optional<int> dueAt = number ? std::optional<int>(counts[function] + *number) : std::nullopt;
-    orders[function].push_back({dueAt, std::move(verdict)});
+    orders[function].push_back({dueAt, verdict});
 }
 
 void Recording::orderData(const std::string& function, const std::string& name, Verdict verdict) {
     requireFunction(function);
     const std::lock_guard<std::mutex> lock(mutex);
-    dataOrders[{function, cimhost::foldedName(name)}] = std::move(verdict);
+    dataOrders[{function, cimhost::foldedName(name)}] = verdict;
 }
 
 void Recording::obey() {

@@ -103,6 +103,7 @@ bool isNull(const std::vector<cimhost::NamedValue>& values, const std::string& n
 
 std::vector<std::string> namesOf(const std::vector<cimhost::NamedValue>& values) {
     std::vector<std::string> names;
+    names.reserve(values.size());
     for (const cimhost::NamedValue& each : values) {
         names.push_back(each.name);
     }
