@@ -12,9 +12,10 @@ constexpr std::int64_t largestNumber = 0xFFFF;
 
 /** A number derived from the machine's that does not give the machine's own away. */
 std::string defaultIdentifyingNumber() {
-    const sd_id128_t application = SD_ID128_MAKE(5d, 3e, 0c, 94, 8a, 17, 4b, 62, 9f, 26, c1, 70, de, 48, b3, 05);
+    sd_id128_t agent{};
     sd_id128_t number{};
-    if (::sd_id128_get_machine_app_specific(application, &number) < 0) {
+    if (::sd_id128_from_string("5d3e0c948a174b629f26c170de48b305", &agent) < 0 ||
+        ::sd_id128_get_machine_app_specific(agent, &number) < 0) {
         return "unknown";
     }
     char text[SD_ID128_STRING_MAX];
