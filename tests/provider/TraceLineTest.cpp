@@ -5,6 +5,9 @@
 
 #include <gmock/gmock.h>
 
+#include <array>
+#include <sstream>
+
 namespace {
 
 using namespace KO;
@@ -221,7 +224,15 @@ template <class Exception>
 class ThrownMessage : public testing::Test {};
 
 using ExceptionClasses = testing::Types<InstrumentationException, FrameworkException, ProviderException>;
-TYPED_TEST_SUITE(ThrownMessage, ExceptionClasses);
+
+struct ExceptionNames {
+    template <class Exception>
+    static std::string GetName(int number) {
+        return std::array{"Instrumentation", "Framework", "Provider"}.at(static_cast<std::size_t>(number));
+    }
+};
+
+TYPED_TEST_SUITE(ThrownMessage, ExceptionClasses, ExceptionNames);
 
 TYPED_TEST(ThrownMessage, IsWhatTheExceptionAndItsCopiesSay) {
     std::string text = "Lease record not available";

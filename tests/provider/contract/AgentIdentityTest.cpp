@@ -10,9 +10,7 @@ namespace contract {
 namespace {
 
 namespace fs = std::filesystem;
-using testing::Each;
 using testing::ElementsAre;
-using testing::EndsWith;
 using testing::IsEmpty;
 using testsupport::named;
 using testsupport::text;

@@ -14,9 +14,7 @@
 namespace contract {
 namespace {
 
-using testing::ElementsAreArray;
 using testing::IsEmpty;
-using testing::SizeIs;
 
 /** What a property may be. */
 enum Trait : unsigned {
@@ -135,14 +133,16 @@ std::vector<std::string> described(const std::vector<PropertyRow>& rows, Accepts
     return texts;
 }
 
+cimhost::Schema readSchema() {
+    cimhost::Schema read;
+    const std::filesystem::path golden(CONTRACT_GOLDEN);
+    cimhost::MofReader(read).readFile(golden / "../../../../schema/velko.mof");
+    return read;
+}
+
 /** The classes as the MOF files declare them. */
 const cimhost::Schema& schema() {
-    static const cimhost::Schema& read = [] {
-        auto& made = *new cimhost::Schema;
-        const std::filesystem::path golden(CONTRACT_GOLDEN);
-        cimhost::MofReader(made).readFile(golden / "../../../../schema/velko.mof");
-        return std::ref(made);
-    }();
+    static const cimhost::Schema read = readSchema();
     return read;
 }
 

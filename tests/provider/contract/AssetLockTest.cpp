@@ -10,7 +10,6 @@
 namespace contract {
 namespace {
 
-using testing::Each;
 using testing::SizeIs;
 using testsupport::named;
 using testsupport::text;

@@ -8,13 +8,11 @@ namespace contract {
 namespace {
 
 namespace fs = std::filesystem;
-using testing::AllOf;
 using testing::Contains;
 using testing::Each;
 using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
-using testing::Pair;
 using testsupport::dateTime;
 using testsupport::named;
 using testsupport::text;

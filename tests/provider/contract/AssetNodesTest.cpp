@@ -1,13 +1,14 @@
 #include "AgentNodes.h"
 #include "AssetFixture.h"
 
+#include <memory>
+
 // The asset identification on agents whose instrumentation tree lacks something, or has more than one computer.
 
 namespace contract {
 namespace {
 
 using testing::ElementsAre;
-using testing::IsEmpty;
 using testsupport::named;
 using testsupport::text;
 using testsupport::textOf;

@@ -11,7 +11,6 @@ namespace {
 namespace fs = std::filesystem;
 using testing::ElementsAre;
 using testing::IsEmpty;
-using testing::Not;
 using testsupport::named;
 using testsupport::text;
 

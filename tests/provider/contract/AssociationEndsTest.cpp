@@ -1,5 +1,8 @@
 #include "AssociationFixture.h"
 
+#include <optional>
+#include <utility>
+
 // From one end of an association to the other.
 
 namespace contract {

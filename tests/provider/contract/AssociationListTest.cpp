@@ -1,5 +1,7 @@
 #include "AssociationFixture.h"
 
+#include <cctype>
+
 // Enumeration of an association class: pairs of a computer system and a record.
 
 namespace contract {
@@ -7,7 +9,6 @@ namespace {
 
 using testing::ElementsAre;
 using testing::IsEmpty;
-using testsupport::textOf;
 
 class AssociationListTest : public AssociationTest {};
 

@@ -273,7 +273,7 @@ TEST_P(HostileTextTest, AnySequenceOfRequestsAndRestartsIsAsTheRulesHaveIt) {
         return model.records.empty() || below(4) == 0 ? word() : model.records[below(model.records.size())].front();
     };
     constexpr std::size_t mostRecords = 6;
-    for (int step = 0; step < 200 && !HasFailure(); ++step) {
+    for (int step = 0; step < 80 && !HasFailure(); ++step) {
         SCOPED_TRACE(step);
         const std::size_t choice = below(20);
         if (model.records.size() >= mostRecords || choice < 4) {

@@ -1,0 +1,1 @@
+// Stands for the headers that all tests share: see tests/CMakeLists.txt.
