@@ -49,25 +49,6 @@ unsigned short classIdOf(const CallSite& site, Class requestedClass) {
 }
 
 /**
- * Runs an operation's body for a class. What it throws is only logged: the object manager sees a
- * success with whatever was returned before. Exceptions of other kinds leave the provider.
- */
-CMPIStatus serve(const CallSite& site, Operation operation, unsigned short classId, Request& request) {
-    try {
-        bodyOf(operation, classId)(request);
-    } catch (const std::exception& failure) {
-        traceMessage({site.unit, Level::error, site.function, site.line}, failure.what());
-    }
-    return request.status;
-}
-
-/** The answer of an operation that is only noted. */
-CMPIStatus note(const CallSite& site, CMPIrc rc) {
-    traceMethod(site);
-    return {rc, nullptr};
-}
-
-/**
  * The namespace in which a new instance is named. The status that the request will answer is
  * written by the two calls and stays as they left it.
  */
@@ -83,6 +64,31 @@ std::string nameSpaceOf(const CMPIObjectPath* ref, CMPIStatus& status) {
     return status.rc == CMPI_RC_OK && characters != nullptr ? characters : "";
 }
 
+/**
+ * Runs an operation's body for the class of a path or of a name. What is thrown is only logged: the
+ * object manager sees a success with whatever was returned before. Exceptions of other kinds than
+ * std::exception leave the provider.
+ */
+template <class Class>
+CMPIStatus serve(const CallSite& site, Operation operation, Class requestedClass, Request& request) {
+    try {
+        const unsigned short classId = classIdOf(site, requestedClass);
+        if (operation == Operation::createInstance) {
+            request.nameSpace = nameSpaceOf(request.path, request.status);
+        }
+        bodyOf(operation, classId)(request);
+    } catch (const std::exception& failure) {
+        traceMessage({site.unit, Level::error, site.function, site.line}, failure.what());
+    }
+    return request.status;
+}
+
+/** The answer of an operation that is only noted. */
+CMPIStatus note(const CallSite& site, CMPIrc rc) {
+    traceMethod(site);
+    return {rc, nullptr};
+}
+
 CMPIStatus LeaseAndWarranty_Cleanup(CMPIInstanceMI*, const CMPIContext*, CMPIBoolean) {
     return note(at(unit), CMPI_RC_OK);
 }
@@ -91,30 +97,28 @@ CMPIStatus LeaseAndWarranty_EnumInstanceNames(CMPIInstanceMI*, const CMPIContext
                                               const CMPIObjectPath* ref) {
     const EntryMarkers markers(at(unit));
     Request request{broker, ctx, result, ref};
-    return serve(at(unit), Operation::enumInstanceNames, classIdOf(at(unit), ref), request);
+    return serve(at(unit), Operation::enumInstanceNames, ref, request);
 }
 
 CMPIStatus LeaseAndWarranty_EnumInstances(CMPIInstanceMI*, const CMPIContext* ctx, const CMPIResult* result,
                                           const CMPIObjectPath* ref, const char** properties) {
     const EntryMarkers markers(at(unit));
     Request request{broker, ctx, result, ref, properties};
-    return serve(at(unit), Operation::enumInstances, classIdOf(at(unit), ref), request);
+    return serve(at(unit), Operation::enumInstances, ref, request);
 }
 
 CMPIStatus LeaseAndWarranty_GetInstance(CMPIInstanceMI*, const CMPIContext* ctx, const CMPIResult* result,
                                         const CMPIObjectPath* ref, const char** properties) {
     const EntryMarkers markers(at(unit));
     Request request{broker, ctx, result, ref, properties};
-    return serve(at(unit), Operation::getInstance, classIdOf(at(unit), ref), request);
+    return serve(at(unit), Operation::getInstance, ref, request);
 }
 
 CMPIStatus LeaseAndWarranty_CreateInstance(CMPIInstanceMI*, const CMPIContext* ctx, const CMPIResult* result,
                                            const CMPIObjectPath* ref, const CMPIInstance*) {
     const EntryMarkers markers(at(unit));
-    const unsigned short classId = classIdOf(at(unit), ref);
     Request request{broker, ctx, result, ref};
-    request.nameSpace = nameSpaceOf(ref, request.status);
-    return serve(at(unit), Operation::createInstance, classId, request);
+    return serve(at(unit), Operation::createInstance, ref, request);
 }
 
 CMPIStatus LeaseAndWarranty_ModifyInstance(CMPIInstanceMI*, const CMPIContext* ctx, const CMPIResult* result,
@@ -122,14 +126,14 @@ CMPIStatus LeaseAndWarranty_ModifyInstance(CMPIInstanceMI*, const CMPIContext* c
                                            const char** properties) {
     const EntryMarkers markers(at(unit));
     Request request{broker, ctx, result, ref, properties, inst};
-    return serve(at(unit), Operation::modifyInstance, classIdOf(at(unit), ref), request);
+    return serve(at(unit), Operation::modifyInstance, ref, request);
 }
 
 CMPIStatus LeaseAndWarranty_DeleteInstance(CMPIInstanceMI*, const CMPIContext* ctx, const CMPIResult* result,
                                            const CMPIObjectPath* ref) {
     const EntryMarkers markers(at(unit));
     Request request{broker, ctx, result, ref};
-    return serve(at(unit), Operation::deleteInstance, classIdOf(at(unit), ref), request);
+    return serve(at(unit), Operation::deleteInstance, ref, request);
 }
 
 CMPIStatus LeaseAndWarranty_ExecQuery(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*,
@@ -146,7 +150,7 @@ CMPIStatus LeaseAndWarranty_Associators(CMPIAssociationMI*, const CMPIContext* c
                                         const char*, const char** properties) {
     const EntryMarkers markers(at(unit));
     Request request{broker, ctx, result, ref, properties};
-    return serve(at(unit), Operation::associators, classIdOf(at(unit), assocClass), request);
+    return serve(at(unit), Operation::associators, assocClass, request);
 }
 
 CMPIStatus LeaseAndWarranty_AssociatorNames(CMPIAssociationMI*, const CMPIContext* ctx, const CMPIResult* result,
@@ -154,7 +158,7 @@ CMPIStatus LeaseAndWarranty_AssociatorNames(CMPIAssociationMI*, const CMPIContex
                                             const char*) {
     const EntryMarkers markers(at(unit));
     Request request{broker, ctx, result, ref};
-    return serve(at(unit), Operation::associatorNames, classIdOf(at(unit), assocClass), request);
+    return serve(at(unit), Operation::associatorNames, assocClass, request);
 }
 
 CMPIStatus LeaseAndWarranty_References(CMPIAssociationMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*,
