@@ -134,7 +134,7 @@ TEST_P(AssociationEndsTest, ComputerSystemsAreHandedOutAsTheObjectManagerGaveThe
     EXPECT_EQ(textsOf(outcome.instances()), textsOf({computerSystem("alpha"), computerSystem("beta")}));
 }
 
-TEST_P(AssociationEndsTest, WhichComputerTheRecordBelongsToDoesNotNarrowThem) {
+TEST_P(AssociationEndsTest, TheRecordsOwnComputerDoesNotNarrowThem) {
     knowComputers({"alpha", "beta", "gamma"});
     EXPECT_THAT(textsOf(associatorNames(keyedPath(side().element, ofGamma)).paths()),
                 ElementsAre(computer("alpha"), computer("beta")));
