@@ -3,6 +3,7 @@
 // Definitions of RecordAdapter. Included by the source file of each adapter and nowhere else, so that
 // each adapter's code and trace buffers stand in its own unit.
 
+#include "ElementAdapterImpl.h"
 #include "KO/Instrumentation.h"
 #include "KO/ProviderUtilities.h"
 #include "PropertyTable.h"
@@ -12,7 +13,7 @@
 #include <cmpift.h>
 
 #include <optional>
-#include <utility>
+#include <string>
 
 namespace KO::LeaseWarrantyProvider {
 
@@ -39,41 +40,17 @@ std::optional<std::string> stringKey(const CMPIObjectPath* path, const char* nam
 
 template <class Policy>
 RecordAdapter<Policy>::RecordAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext,
-                                     std::string requestNameSpace)
-    : broker(requestBroker), context(requestContext), nameSpace(std::move(requestNameSpace)) {
-    const Traced traced(at(Policy::unit, Level::flow, Policy::constructor), label::broker, broker, label::context,
-                        context);
-}
-
-template <class Policy>
-RecordAdapter<Policy>::RecordAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext,
                                      const CMPIObjectPath* path)
-    : broker(requestBroker), context(requestContext), nameSpace(ProviderUtilities::getNamespace(path)) {
-    const Traced traced(at(Policy::unit, Level::flow, Policy::constructor), label::broker, broker, label::context,
-                        context, label::objectPath, path);
-    setObjectPath(path);
-}
-
-template <class Policy>
-RecordAdapter<Policy>::~RecordAdapter() noexcept(false) {
-    const Traced traced(at(Policy::unit, Level::flow, Policy::destructor));
-}
-
-template <class Policy>
-RecordAdapter<Policy>::operator bool() {
-    const Traced traced(at(Policy::unit));
-    return element;
-}
-
-template <class Policy>
-void RecordAdapter<Policy>::operator++() {
-    const Traced traced(at(Policy::unit));
-    ++element;
-}
+    : ElementAdapter<Policy>(requestBroker, requestContext, path, &narrow) {}
 
 template <class Policy>
 void RecordAdapter<Policy>::setObjectPath(const CMPIObjectPath* path) {
-    const Traced traced(at(Policy::unit), label::objectPath, path);
+    narrow(element, path);
+}
+
+template <class Policy>
+void RecordAdapter<Policy>::narrow(typename Policy::Element& element, const CMPIObjectPath* path) {
+    const Traced traced(at(Policy::unit, Level::flow, "setObjectPath"), label::objectPath, path);
     if (ProviderUtilities::getKeyCount(path) == 0) {
         return;
     }
@@ -111,18 +88,14 @@ CMPIInstance* RecordAdapter<Policy>::createCMPIInstance(const CMPIObjectPath* de
     traceVariable(at(Policy::unit), "instanceId", instanceId);
 
     // Asked for at each creation, although nothing in the record depends on it.
-    const Instrumentation instrumentation;
+    Instrumentation instrumentation;
     instrumentation.convertPathToString(instrumentation.getPathToComputer());
 
-    if (!found) {
+    if (!found || !element.create(instanceId)) {
         return nullptr;
     }
-    const bool created = element.create(instanceId);
     if constexpr (Policy::tracesCreation) {
-        traceVariable(at(Policy::unit), "Instance Created", created ? 1U : 0U);
-    }
-    if (!created) {
-        return nullptr;
+        traceVariable(at(Policy::unit), "Instance Created", 1U);
     }
     setObjectPath(desiredObjectPath);
     return getCMPIInstance(nullptr);

@@ -28,7 +28,7 @@ const Property properties[] = {
     {"ProductName", [](const Computer& computer) { return computer.productName; }},
 };
 
-std::optional<std::string> read(const Instrumentation& node, NodeLexicon::Properties property) {
+std::optional<std::string> read(Instrumentation& node, NodeLexicon::Properties property) {
     std::string text;
     return node.getProperty(property, text) ? std::make_optional(text) : std::nullopt;
 }

@@ -1,5 +1,6 @@
 #include "Computer.h"
 #include "Export.h"
+#include "KO/ClassIds.h"
 #include "KO/ProviderUtilities.h"
 
 #include <cmpift.h>
@@ -13,8 +14,6 @@
 namespace KO::ComputerSystem {
 
 namespace {
-
-constexpr unsigned short computerSystemId = 1;
 
 std::atomic<const CMPIBroker*> theBroker{nullptr};
 
@@ -63,7 +62,7 @@ private:
 template <typename Handler>
 CMPIStatus guarded(const CMPIObjectPath* path, const Handler& handler) noexcept {
     try {
-        if (ProviderUtilities::getClassId(path) != computerSystemId) {
+        if (ProviderUtilities::getClassId(path) != ClassId::computerSystem) {
             return status(CMPI_RC_ERR_INVALID_CLASS, "This provider serves VELKO_ComputerSystem only");
         }
         return handler();

@@ -37,7 +37,7 @@ void Instrumentation::selectNode(const std::string& path) {
     implementation->select([&path](const Node& node) { return node.path == path; });
 }
 
-Instrumentation::operator bool() const {
+Instrumentation::operator bool() {
     return implementation->current() != nullptr;
 }
 
@@ -47,7 +47,7 @@ void Instrumentation::operator++() {
     }
 }
 
-bool Instrumentation::getProperty(NodeLexicon::Properties property, std::string& value) const {
+bool Instrumentation::getProperty(NodeLexicon::Properties property, std::string& value) {
     const Node* node = implementation->current();
     if (node == nullptr) {
         return false;
@@ -60,12 +60,12 @@ bool Instrumentation::getProperty(NodeLexicon::Properties property, std::string&
     return true;
 }
 
-std::string Instrumentation::getPathToNode() const {
+std::string Instrumentation::getPathToNode() {
     const Node* node = implementation->current();
     return node != nullptr ? node->path : std::string();
 }
 
-std::string Instrumentation::getPathToComputer() const {
+std::string Instrumentation::getPathToComputer() {
     for (const Node& node : implementation->agent->tree.nodes()) {
         if (node.type == NodeLexicon::NT_COMPUTER) {
             return node.path;
@@ -74,10 +74,10 @@ std::string Instrumentation::getPathToComputer() const {
     return {};
 }
 
-std::string Instrumentation::convertPathToString(const std::string& path) const {
+std::string Instrumentation::convertPathToString(const std::string& path) {
     return pathToText(path);
 }
-std::string Instrumentation::convertStringToPath(const std::string& text) const {
+std::string Instrumentation::convertStringToPath(const std::string& text) {
     return textToPath(text);
 }
 

@@ -30,7 +30,7 @@ public:
     void selectNode(const std::string& path);
 
     /** Whether the cursor stands on a node. */
-    operator bool() const;
+    operator bool();
 
     /** Moves to the next selected node; past the last, stands on none. There it stays. */
     void operator++();
@@ -40,22 +40,22 @@ public:
      * @param value receives the text; untouched when the answer is false
      * @return false when the node has no such property or the cursor stands on no node
      */
-    bool getProperty(NodeLexicon::Properties property, std::string& value) const;
+    bool getProperty(NodeLexicon::Properties property, std::string& value);
 
     /** The current node's path, opaque to callers; empty when the cursor stands on no node. */
-    std::string getPathToNode() const;
+    std::string getPathToNode();
 
     /** The path of the managed computer: of the first computer node, empty if there is none. */
-    std::string getPathToComputer() const;
+    std::string getPathToComputer();
 
     /**
      * The printable text form of a path. It has no white space and no underscore, so that record
      * files keep it unchanged. The empty path gives the empty text.
      */
-    std::string convertPathToString(const std::string& path) const;
+    std::string convertPathToString(const std::string& path);
 
     /** The inverse of convertPathToString. A text that is no text form of a path is given back. */
-    std::string convertStringToPath(const std::string& text) const;
+    std::string convertStringToPath(const std::string& text);
 
 private:
     struct Implementation;

@@ -30,7 +30,7 @@ std::vector<std::string> pathsOf(NodeType type) {
 TEST(Instrumentation, StandsOnNoNodeAtFirst) {
     Instrumentation cursor;
     std::string value = "kept";
-    EXPECT_FALSE(cursor);
+    EXPECT_FALSE(static_cast<bool>(cursor));
     EXPECT_EQ(cursor.getPathToNode(), "");
     EXPECT_FALSE(cursor.getProperty(PROPERTY_NAME, value));
     EXPECT_EQ(value, "kept");
@@ -46,10 +46,10 @@ TEST(Instrumentation, SelectsAllNodesOfATypeInTreeOrder) {
 TEST(Instrumentation, StaysBeyondTheLastNode) {
     Instrumentation cursor;
     cursor.selectNode(NT_SYSTEM);
-    ASSERT_TRUE(cursor);
+    ASSERT_TRUE(static_cast<bool>(cursor));
     for (int step = 0; step < 3; ++step) {
         ++cursor;
-        EXPECT_FALSE(cursor);
+        EXPECT_FALSE(static_cast<bool>(cursor));
         EXPECT_EQ(cursor.getPathToNode(), "");
     }
 }
@@ -57,14 +57,14 @@ TEST(Instrumentation, StaysBeyondTheLastNode) {
 TEST(Instrumentation, SelectsTheNodeAtAPath) {
     Instrumentation cursor;
     cursor.selectNode("/rack 1/host_2");
-    ASSERT_TRUE(cursor);
+    ASSERT_TRUE(static_cast<bool>(cursor));
     EXPECT_EQ(cursor.getPathToNode(), "/rack 1/host_2");
     ++cursor;
-    EXPECT_FALSE(cursor);
+    EXPECT_FALSE(static_cast<bool>(cursor));
     cursor.selectNode("/rack 1");
-    EXPECT_FALSE(cursor);
+    EXPECT_FALSE(static_cast<bool>(cursor));
     cursor.selectNode("");
-    EXPECT_FALSE(cursor);
+    EXPECT_FALSE(static_cast<bool>(cursor));
 }
 
 TEST(Instrumentation, StartsAfreshWithEachSelection) {
@@ -74,7 +74,7 @@ TEST(Instrumentation, StartsAfreshWithEachSelection) {
     cursor.selectNode(NT_COMPUTER);
     EXPECT_EQ(cursor.getPathToNode(), "/system/computer");
     cursor.selectNode("/no/such/node");
-    EXPECT_FALSE(cursor);
+    EXPECT_FALSE(static_cast<bool>(cursor));
 }
 
 TEST(Instrumentation, ReadsPropertiesThatTheNodeHas) {
