@@ -43,14 +43,22 @@ void fillPairs(const A& details, Filling& filling, const char*) {
     }
 }
 
+/** Replaces the text by the property's value, if the instance has it. */
+void takeText(const CMPIInstance* instance, const char* name, std::string& text) {
+    std::string value;
+    if (ProviderUtilities::getProperty(instance, name, value, false)) {
+        text = value;
+    }
+}
+
 /** Always five pairs: one that the instance does not carry repeats the one before it. */
 void modifyPairs(A& details, const CMPIInstance* instance) {
     std::string label;
     std::string data;
     std::vector<A::PersonalizedPair> pairs;
     for (const PairProperties& properties : pairProperties) {
-        ProviderUtilities::getProperty(instance, properties.label, label, false);
-        ProviderUtilities::getProperty(instance, properties.data, data, false);
+        takeText(instance, properties.label, label);
+        takeText(instance, properties.data, data);
         pairs.emplace_back(label, data);
     }
     details.setPersonalizedData(pairs);
@@ -102,31 +110,32 @@ const std::array<KeyFilter<A>, 4> AssetClass::filters{{
     {"Version", A::FILTER_VERSION},
 }};
 
+/** Changes are a table of their own, above: they are taken in another order than an instance is filled. */
 const std::array<PropertyRow<A>, 24> AssetClass::properties{{
-    readOnly<A, &A::getIdentifyingNumber>("IdentifyingNumber"),
-    readOnly<A, &A::getName, ValueForm::typed, Presence::always>("Name"),
-    readOnly<A, &A::getVendor, ValueForm::typed, Presence::always>("Vendor"),
-    readOnly<A, &A::getVersion>("Version"),
-    readOnly<A, &A::getCaption>("Caption"),
-    readOnly<A, &A::getDescription>("Description"),
-    readOnly<A, &A::getCSName, ValueForm::typed, Presence::always>("CSName"),
-    readOnly<A, &A::getPrimaryOwnerName>("PrimaryOwnerName"),
-    readOnly<A, &A::getPrimaryOwnerPhone>("PrimaryOwnerPhone"),
-    readOnly<A, &A::getPrimaryOwnerPosition>("PrimaryOwnerPosition"),
-    readOnly<A, &A::getPrimaryOwnerDepartment>("PrimaryOwnerDepartment"),
-    readOnly<A, &A::getAssetIDStringArea>("AssetIDStringArea"),
-    readOnly<A, &A::getAssetNumber>("AssetNumber"),
-    readOnly<A, &A::getAssetIdTag>("AssetIdTag"),
-    readOnly<A, &A::getProductName>("ProductName"),
+    filled<A, &A::getIdentifyingNumber>("IdentifyingNumber"),
+    filled<A, &A::getName, ValueForm::typed, Presence::always>("Name"),
+    filled<A, &A::getVendor, ValueForm::typed, Presence::always>("Vendor"),
+    filled<A, &A::getVersion>("Version"),
+    filled<A, &A::getCaption>("Caption"),
+    filled<A, &A::getDescription>("Description"),
+    filled<A, &A::getCSName, ValueForm::typed, Presence::always>("CSName"),
+    filled<A, &A::getPrimaryOwnerName>("PrimaryOwnerName"),
+    filled<A, &A::getPrimaryOwnerPhone>("PrimaryOwnerPhone"),
+    filled<A, &A::getPrimaryOwnerPosition>("PrimaryOwnerPosition"),
+    filled<A, &A::getPrimaryOwnerDepartment>("PrimaryOwnerDepartment"),
+    filled<A, &A::getAssetIDStringArea>("AssetIDStringArea"),
+    filled<A, &A::getAssetNumber>("AssetNumber"),
+    filled<A, &A::getAssetIdTag>("AssetIdTag"),
+    filled<A, &A::getProductName>("ProductName"),
     {"PersonalizedLabel1", &fillPairs, nullptr},
-    readOnly<A, &A::getLastInventoried, ValueForm::dateTime>("LastInventoried"),
-    readOnly<A, &A::getPurchaseDate, ValueForm::dateTime>("PurchaseDate"),
-    readOnly<A, &A::getSystemLocation, ValueForm::text>("SystemLocation"),
-    readOnly<A, &A::getLocalDateTime, ValueForm::dateTime>("LocalDateTime"),
-    readOnly<A, &A::getZOPMProfile>("ZOPMProfile"),
-    readOnly<A, &A::getZOPMUpdateTime, ValueForm::dateTime>("ZOPMUpdateTime"),
-    readOnly<A, &A::getDeploymentProfile>("DeploymentProfile"),
-    readOnly<A, &A::getDeploymentUpdateTime, ValueForm::dateTime>("DeploymentUpdateTime"),
+    filled<A, &A::getLastInventoried, ValueForm::dateTime>("LastInventoried"),
+    filled<A, &A::getPurchaseDate, ValueForm::dateTime>("PurchaseDate"),
+    filled<A, &A::getSystemLocation, ValueForm::text>("SystemLocation"),
+    filled<A, &A::getLocalDateTime, ValueForm::dateTime>("LocalDateTime"),
+    filled<A, &A::getZOPMProfile>("ZOPMProfile"),
+    filled<A, &A::getZOPMUpdateTime, ValueForm::dateTime>("ZOPMUpdateTime"),
+    filled<A, &A::getDeploymentProfile>("DeploymentProfile"),
+    filled<A, &A::getDeploymentUpdateTime, ValueForm::dateTime>("DeploymentUpdateTime"),
 }};
 
 void AssetClass::modify(AssetIDDetails& details, const CMPIInstance* instance) {
@@ -138,6 +147,7 @@ void AssetClass::modify(AssetIDDetails& details, const CMPIInstance* instance) {
     details.flushAssetData();
 }
 
+template class ElementAdapter<AssetClass>;
 template class ProductAdapter<AssetClass>;
 template void CMPIAssetIDDetail::modifyCMPIInstance<AssetClass>(const CMPIInstance*, const char**);
 

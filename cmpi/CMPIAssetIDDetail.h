@@ -28,6 +28,7 @@ struct AssetClass {
 /** The adapter of VELKO_AssetIDDetails. */
 using CMPIAssetIDDetail = ProductAdapter<AssetClass>;
 
+extern template class ElementAdapter<AssetClass>;
 extern template class ProductAdapter<AssetClass>;
 extern template void CMPIAssetIDDetail::modifyCMPIInstance<AssetClass>(const CMPIInstance*, const char**);
 

@@ -22,7 +22,9 @@ public:
 
     /**
      * Has the instances of the path's class enumerated, in its namespace and without regard to its
-     * keys, and stands on the first. Throws ProviderException when there is none to be had.
+     * keys, and stands on the first. Throws ProviderException when there is none to be had, also for a
+     * null path, which the object manager is not asked about. Stands on none when what comes first is no
+     * instance.
      */
     void setObjectPath(const CMPIObjectPath* path);
 

@@ -24,6 +24,7 @@ struct LeaseClass {
 /** The adapter of VELKO_Lease. */
 using CMPILease = RecordAdapter<LeaseClass>;
 
+extern template class ElementAdapter<LeaseClass>;
 extern template class RecordAdapter<LeaseClass>;
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -29,17 +29,18 @@ const std::array<KeyFilter<A>, 5> AgentClass::filters{{
 }};
 
 const std::array<PropertyRow<A>, 9> AgentClass::properties{{
-    readOnly<A, &A::getCaption>("Caption"),
-    readOnly<A, &A::getDescription>("Description"),
-    readOnly<A, &A::getBuildNumber>("BuildNumber"),
-    readOnly<A, &A::getStatus>("Status"),
-    readOnly<A, &A::getName>("Name"),
-    readOnly<A, &A::getProductName>("ProductName"),
-    readOnly<A, &A::getIdentifyingNumber>("IdentifyingNumber"),
-    readOnly<A, &A::getVendor>("Vendor"),
-    readOnly<A, &A::getVersion>("Version"),
+    filled<A, &A::getCaption>("Caption"),
+    filled<A, &A::getDescription>("Description"),
+    filled<A, &A::getBuildNumber>("BuildNumber"),
+    filled<A, &A::getStatus>("Status"),
+    filled<A, &A::getName>("Name"),
+    filled<A, &A::getProductName>("ProductName"),
+    filled<A, &A::getIdentifyingNumber>("IdentifyingNumber"),
+    filled<A, &A::getVendor>("Vendor"),
+    filled<A, &A::getVersion>("Version"),
 }};
 
+template class ElementAdapter<AgentClass>;
 template class ProductAdapter<AgentClass>;
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -25,6 +25,7 @@ struct AgentClass {
 /** The adapter of VELKO_OstrelAgent, which is only read. */
 using CMPIOstrelAgent = ProductAdapter<AgentClass>;
 
+extern template class ElementAdapter<AgentClass>;
 extern template class ProductAdapter<AgentClass>;
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -24,6 +24,7 @@ struct WarrantyClass {
 /** The adapter of VELKO_Warranty. */
 using CMPIWarranty = RecordAdapter<WarrantyClass>;
 
+extern template class ElementAdapter<WarrantyClass>;
 extern template class RecordAdapter<WarrantyClass>;
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "ElementAdapter.h"
 #include "PropertyTable.h"
 
 #include <cmpidt.h>
@@ -46,23 +47,12 @@ struct KeyFilter {
  *   modify(element, instance)   of a class that can be modified
  */
 template <class Policy>
-class ProductAdapter {
+class ProductAdapter : public ElementAdapter<Policy> {
 public:
-    /** Without regard to keys. */
-    ProductAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext, std::string requestNameSpace);
+    using ElementAdapter<Policy>::ElementAdapter;
 
-    /** What the path's keys select, or all if it has none. */
+    /** What the path's keys select, or all if it has none. May throw what the element's filters throw. */
     ProductAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext, const CMPIObjectPath* path);
-
-    ~ProductAdapter();
-    ProductAdapter(const ProductAdapter&) = delete;
-    ProductAdapter& operator=(const ProductAdapter&) = delete;
-
-    /** Whether the adapter stands on an instance. */
-    operator bool();
-
-    /** Moves to the next instance that the path selects. */
-    void operator++();
 
     /** Makes filters of the path's keys. May throw what the element's filters throw. */
     void setObjectPath(const CMPIObjectPath* path);
@@ -78,10 +68,11 @@ public:
     void modifyCMPIInstance(const CMPIInstance* referenceInstance, const char** properties);
 
 private:
-    const CMPIBroker* broker;
-    const CMPIContext* context;
-    std::string nameSpace;
-    typename Policy::Element element{};
+    using ElementAdapter<Policy>::broker;
+    using ElementAdapter<Policy>::nameSpace;
+    using ElementAdapter<Policy>::element;
+
+    static void narrow(typename Policy::Element& element, const CMPIObjectPath* path);
 };
 
 }  // namespace KO::LeaseWarrantyProvider

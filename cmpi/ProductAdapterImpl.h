@@ -3,12 +3,13 @@
 // Definitions of ProductAdapter. Included by the source file of each adapter and nowhere else, so that
 // each adapter's code and trace buffers stand in its own unit.
 
+#include "ElementAdapterImpl.h"
 #include "KO/ProviderUtilities.h"
 #include "ProductAdapter.h"
 #include "PropertyTable.h"
 #include "Trace.h"
 
-#include <utility>
+#include <string>
 
 namespace KO::LeaseWarrantyProvider {
 
@@ -18,48 +19,24 @@ constexpr const char* keyValueName = "l_keyValue";
 
 template <class Policy>
 ProductAdapter<Policy>::ProductAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext,
-                                       std::string requestNameSpace)
-    : broker(requestBroker), context(requestContext), nameSpace(std::move(requestNameSpace)) {
-    const Traced traced(at(Policy::unit, Level::flow, Policy::constructor), label::broker, broker, label::context,
-                        context);
-}
-
-template <class Policy>
-ProductAdapter<Policy>::ProductAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext,
                                        const CMPIObjectPath* path)
-    : broker(requestBroker), context(requestContext), nameSpace(ProviderUtilities::getNamespace(path)) {
-    const Traced traced(at(Policy::unit, Level::flow, Policy::constructor), label::broker, broker, label::context,
-                        context, label::objectPath, path);
-    setObjectPath(path);
-}
-
-template <class Policy>
-ProductAdapter<Policy>::~ProductAdapter() {
-    const Traced traced(at(Policy::unit, Level::flow, Policy::destructor));
-}
-
-template <class Policy>
-ProductAdapter<Policy>::operator bool() {
-    const Traced traced(at(Policy::unit));
-    return element;
-}
-
-template <class Policy>
-void ProductAdapter<Policy>::operator++() {
-    const Traced traced(at(Policy::unit));
-    ++element;
-}
+    : ElementAdapter<Policy>(requestBroker, requestContext, path, &narrow) {}
 
 template <class Policy>
 void ProductAdapter<Policy>::setObjectPath(const CMPIObjectPath* path) {
-    const Traced traced(at(Policy::unit), label::objectPath, path);
+    narrow(element, path);
+}
+
+template <class Policy>
+void ProductAdapter<Policy>::narrow(typename Policy::Element& element, const CMPIObjectPath* path) {
+    const Traced traced(at(Policy::unit, Level::flow, "setObjectPath"));
     if (ProviderUtilities::getKeyCount(path) == 0) {
         return;
     }
     for (const auto& filter : Policy::filters) {
         std::string value;
         if (ProviderUtilities::getKeyProperty(path, filter.name, value)) {
-            traceVariable(at(Policy::unit), keyValueName, value);
+            traceVariable(at(Policy::unit, Level::flow, "setObjectPath"), keyValueName, value);
             element.setFilter(filter.type, value);
         }
     }

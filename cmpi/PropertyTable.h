@@ -16,7 +16,7 @@ struct Filling {
 
 /**
  * One property of a CIM class. The rows of a class stand in the order in which its instances are
- * filled; they drive both filling and modification.
+ * filled; they drive filling and, where it keeps that order, modification.
  */
 template <class Element>
 struct PropertyRow {
@@ -25,7 +25,7 @@ struct PropertyRow {
     /** Sets the property from the element. */
     void (*fill)(const Element& element, Filling& filling, const char* name);
 
-    /** Changes the element from the instance, if the instance has the property. Null: read-only. */
+    /** Changes the element from the instance, if the instance has the property. Null: not by this row. */
     void (*modify)(Element& element, const CMPIInstance* instance, const char* name);
 };
 
@@ -114,9 +114,9 @@ void modify(Element& element, const CMPIInstance* instance, const char* name) {
 
 }  // namespace PropertyTableDetail
 
-/** The row of a read-only property. */
+/** The row of a property that is only filled: a read-only one, or one whose changes the class takes in another way. */
 template <class Element, auto getter, ValueForm form = ValueForm::typed, Presence presence = Presence::whenAnswered>
-constexpr PropertyRow<Element> readOnly(const char* name) {
+constexpr PropertyRow<Element> filled(const char* name) {
     return {name, &PropertyTableDetail::fill<Element, getter, form, presence>, nullptr};
 }
 

@@ -1,8 +1,8 @@
 #pragma once
 
-#include <cmpidt.h>
+#include "ElementAdapter.h"
 
-#include <string>
+#include <cmpidt.h>
 
 namespace KO::LeaseWarrantyProvider {
 
@@ -19,26 +19,18 @@ namespace KO::LeaseWarrantyProvider {
  *   unit, properties             trace unit and table of PropertyRow of the class
  */
 template <class Policy>
-class RecordAdapter {
+class RecordAdapter : public ElementAdapter<Policy> {
 public:
-    /** For creation: all records, no filter. */
-    RecordAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext, std::string requestNameSpace);
+    /** For creation: all records. */
+    using ElementAdapter<Policy>::ElementAdapter;
 
-    /** For every other request: the record that the path's key names, or all if it has no key. */
+    /**
+     * For every other request: the record that the path's key names, or all if it has no key that can be
+     * read. When the adapter ends and anything was changed, the data file is written back; that may throw.
+     */
     RecordAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext, const CMPIObjectPath* path);
 
-    /** Writes the data file back if anything changed; that may throw. */
-    ~RecordAdapter() noexcept(false);
-    RecordAdapter(const RecordAdapter&) = delete;
-    RecordAdapter& operator=(const RecordAdapter&) = delete;
-
-    /** Whether the adapter stands on a record. */
-    operator bool();
-
-    /** Moves to the next record that the path selects. */
-    void operator++();
-
-    /** Narrows the element to the record that the path's key names. A key that cannot be read selects nothing. */
+    /** Narrows the element to the record that the path's key names. A key that cannot be read narrows nothing. */
     void setObjectPath(const CMPIObjectPath* path);
 
     /** Path of the current record; without key when the adapter stands on none, null when it cannot be made. */
@@ -49,7 +41,8 @@ public:
 
     /**
      * Makes a record with the path's key and default values, and stands on it.
-     * @return its instance; null when the path has no key and nothing was made
+     * @return its instance; null when the path has no key, and nothing was made, or when the instance of
+     *     the new record cannot be made
      */
     CMPIInstance* createCMPIInstance(const CMPIObjectPath* desiredObjectPath);
 
@@ -60,10 +53,11 @@ public:
     void deleteCMPIInstance();
 
 private:
-    const CMPIBroker* broker;
-    const CMPIContext* context;
-    std::string nameSpace;
-    typename Policy::Element element{};
+    using ElementAdapter<Policy>::broker;
+    using ElementAdapter<Policy>::nameSpace;
+    using ElementAdapter<Policy>::element;
+
+    static void narrow(typename Policy::Element& element, const CMPIObjectPath* path);
 };
 
 }  // namespace KO::LeaseWarrantyProvider

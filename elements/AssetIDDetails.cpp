@@ -13,6 +13,7 @@
 #include <algorithm>
 #include <array>
 #include <ctime>
+#include <optional>
 #include <variant>
 
 namespace KO {
@@ -37,19 +38,6 @@ constexpr unsigned int presentTime = 3;
 
 /** Stands for an empty label or text, so that all five pairs carry text. */
 constexpr const char* emptyPersonalized = "Null";
-
-struct PairKeys {
-    const char* label;
-    const char* data;
-};
-
-constexpr std::array<PairKeys, AssetIDDetails::pairCount> pairKeys{{
-    {USER_PERSONALIZED_LABEL1_KEY, USER_PERSONALIZED_DATA1_KEY},
-    {USER_PERSONALIZED_LABEL2_KEY, USER_PERSONALIZED_DATA2_KEY},
-    {USER_PERSONALIZED_LABEL3_KEY, USER_PERSONALIZED_DATA3_KEY},
-    {USER_PERSONALIZED_LABEL4_KEY, USER_PERSONALIZED_DATA4_KEY},
-    {USER_PERSONALIZED_LABEL5_KEY, USER_PERSONALIZED_DATA5_KEY},
-}};
 
 /** Holds the file lock while it lives. */
 class FileLock {
@@ -85,57 +73,68 @@ struct AssetIDDetails::StoredFields {
     }};
 };
 
+/** Calls what treats texts or what treats dates on each fixed field, in order. */
+template <class OnText, class OnDate>
+void AssetIDDetails::forEachField(OnText onText, OnDate onDate) {
+    for (const auto& field : StoredFields::all) {
+        if (const auto* text = std::get_if<std::string AssetIDDetails::*>(&field.member)) {
+            onText(field, this->**text);
+        } else {
+            onDate(field, this->*std::get<DateTime AssetIDDetails::*>(field.member));
+        }
+    }
+}
+
 AssetIDDetails::AssetIDDetails() : _FileName(getFileName()) {
     const Traced traced(at(unit));
+    std::optional<PropertyFile> file;
+    std::optional<FileLock> lock;
     try {
         _ComputerNode.selectNode(NodeLexicon::NT_COMPUTER);
         _SystemNode.selectNode(NodeLexicon::NT_SYSTEM);
-        if (_ComputerNode && _SystemNode) {
-            readAll();
+        if (!_ComputerNode || !_SystemNode) {
+            return;
         }
+        file.emplace(File::Path(_FileName));
+        traceMessage(at(unit), "Opening File");
+        lock.emplace();
+        traceMessage(at(unit), "File Locked successfully");
+        file->open(FILE_MODE_READ);
+        traceMessage(at(unit), "File Open successfully");
+        readFixedFields(*file);
+        readPersonalizedPairs(*file);
+        _Loaded = true;
+        file->close();
     } catch (...) {
+        _Loaded = false;
         traceMessage(at(unit), "Throwing Exception in Constructor");
     }
 }
 
-void AssetIDDetails::readAll() {
-    const CallSite site = at(unit, Level::flow, "AssetIDDetails");
-    PropertyFile file{File::Path(_FileName)};
-    traceMessage(site, "Opening File");
-    const FileLock lock;
-    traceMessage(site, "File Locked successfully");
-    file.open(FILE_MODE_READ);
-    traceMessage(site, "File Open successfully");
-    readFixedFields(file);
-    readPersonalizedPairs(file);
-    _Loaded = true;
-    file.close();
+AssetIDDetails::~AssetIDDetails() {
+    const Traced traced(at(unit));
 }
 
 void AssetIDDetails::readFixedFields(PropertyFile& file) {
-    for (const auto& field : StoredFields::all) {
-        if (const auto* text = std::get_if<std::string AssetIDDetails::*>(&field.member)) {
-            this->** text = Utils::ReadStringFromFile(file, field.key);
-            traceVariable(at(unit, Level::flow, "AssetIDDetails"), field.name, this->**text);
-        } else {
-            this->*std::get<DateTime AssetIDDetails::*>(field.member) = Utils::ReadDateFromFile(file, field.key);
-        }
-    }
+    forEachField(
+        [&](const StoredFields::Field& field, std::string& text) {
+            text = Utils::ReadStringFromFile(file, field.key);
+            traceVariable(at(unit, Level::flow, "AssetIDDetails"), field.name, text);
+        },
+        [&](const StoredFields::Field& field, DateTime& date) { date = Utils::ReadDateFromFile(file, field.key); });
 }
 
 void AssetIDDetails::readPersonalizedPairs(PropertyFile& file) {
-    const auto readOrNull = [&](const char* key, const char* name) {
+    const auto readOrNull = [&](const char* key) {
         std::string text = Utils::ReadStringFromFile(file, key);
-        if (text.empty()) {
-            text = emptyPersonalized;
-        }
-        traceVariable(at(unit, Level::flow, "AssetIDDetails"), name, text);
-        return text;
+        return text.empty() ? std::string(emptyPersonalized) : text;
     };
     std::vector<PersonalizedPair> pairs;
     for (const PairKeys& keys : pairKeys) {
-        std::string label = readOrNull(keys.label, "label");
-        std::string data = readOrNull(keys.data, "data");
+        std::string label = readOrNull(keys.label);
+        std::string data = readOrNull(keys.data);
+        traceVariable(at(unit, Level::flow, "AssetIDDetails"), "label", label);
+        traceVariable(at(unit, Level::flow, "AssetIDDetails"), "data", data);
         pairs.emplace_back(std::move(label), std::move(data));
     }
     _PersonalizedData = std::move(pairs);
@@ -147,13 +146,11 @@ void AssetIDDetails::flushAssetData() {
         PropertyFile file{File::Path(_FileName)};
         const FileLock lock;
         file.open(FILE_MODE_WRITE);
-        for (const auto& field : StoredFields::all) {
-            if (const auto* text = std::get_if<std::string AssetIDDetails::*>(&field.member)) {
-                Utils::WriteStringToFile(file, field.key, this->**text);
-            } else {
-                Utils::WriteDateToFile(file, field.key, this->*std::get<DateTime AssetIDDetails::*>(field.member));
-            }
-        }
+        forEachField([&](const StoredFields::Field& field,
+                         const std::string& text) { Utils::WriteStringToFile(file, field.key, text); },
+                     [&](const StoredFields::Field& field, const DateTime& date) {
+                         Utils::WriteDateToFile(file, field.key, date);
+                     });
         for (std::size_t pair = 0; pair < std::min(pairCount, _PersonalizedData.size()); ++pair) {
             Utils::WriteStringToFile(file, pairKeys[pair].label, _PersonalizedData[pair].first);
             Utils::WriteStringToFile(file, pairKeys[pair].data, _PersonalizedData[pair].second);
@@ -166,9 +163,11 @@ void AssetIDDetails::flushAssetData() {
 
 std::wstring AssetIDDetails::getFileName() {
     const Traced traced(at(unit));
-    const FileLock lock;
-    const std::wstring path = make_wstring(PlatformUtilities::getKelsaDataDir()) + assetFileName;
+    std::wstring path;
+    std::optional<FileLock> lock;
     try {
+        lock.emplace();
+        path = make_wstring(PlatformUtilities::getKelsaDataDir()) + assetFileName;
         File file(path);
         file.open(FILE_MODE_WRITE);
         file.close();

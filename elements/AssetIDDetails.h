@@ -55,6 +55,8 @@ public:
 
     /** Reads the file, which is created, empty, if there is none, and stands on the first computer node. */
     AssetIDDetails();
+    /** The file is not written. */
+    ~AssetIDDetails();
     AssetIDDetails(const AssetIDDetails&) = delete;
     AssetIDDetails& operator=(const AssetIDDetails&) = delete;
 
@@ -73,7 +75,7 @@ public:
     /** Writes the snapshot to the file. A failure is only logged. */
     void flushAssetData();
 
-    /** Path of the file, which is created if there is none; a failure of that is only logged. */
+    /** Path of the file, which is created if there is none; a failure is only logged. */
     std::wstring getFileName();
 
     /** @name Stored values
@@ -138,7 +140,8 @@ public:
 private:
     struct StoredFields;
 
-    void readAll();
+    template <class OnText, class OnDate>
+    void forEachField(OnText onText, OnDate onDate);
     void readFixedFields(PropertyFile& file);
     void readPersonalizedPairs(PropertyFile& file);
     bool comparedValue(FilterType type, std::string& value) const;
@@ -149,8 +152,8 @@ private:
 
     bool _Loaded = false;
     std::wstring _FileName{};
-    Instrumentation _ComputerNode{};
-    Instrumentation _SystemNode{};
+    mutable Instrumentation _ComputerNode{};  ///< mutable: the framework's cursor has no operation for constant ones
+    mutable Instrumentation _SystemNode{};
     std::string _AssetNumber{};
     std::string _AssetIdTag{};
     std::string _OwnerName{};

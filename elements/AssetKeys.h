@@ -1,5 +1,7 @@
 #pragma once
 
+#include <array>
+
 /** The keys of the asset data file: the only ones that are read or written. */
 namespace KO::LeaseWarrantyProvider {
 
@@ -24,5 +26,19 @@ constexpr const char* USER_PERSONALIZED_DATA2_KEY = "USER.PersonalizedData2";
 constexpr const char* USER_PERSONALIZED_DATA3_KEY = "USER.PersonalizedData3";
 constexpr const char* USER_PERSONALIZED_DATA4_KEY = "USER.PersonalizedData4";
 constexpr const char* USER_PERSONALIZED_DATA5_KEY = "USER.PersonalizedData5";
+
+/** The keys of one personalized pair. */
+struct PairKeys {
+    const char* label;
+    const char* data;
+};
+
+constexpr std::array<PairKeys, 5> pairKeys{{
+    {USER_PERSONALIZED_LABEL1_KEY, USER_PERSONALIZED_DATA1_KEY},
+    {USER_PERSONALIZED_LABEL2_KEY, USER_PERSONALIZED_DATA2_KEY},
+    {USER_PERSONALIZED_LABEL3_KEY, USER_PERSONALIZED_DATA3_KEY},
+    {USER_PERSONALIZED_LABEL4_KEY, USER_PERSONALIZED_DATA4_KEY},
+    {USER_PERSONALIZED_LABEL5_KEY, USER_PERSONALIZED_DATA5_KEY},
+}};
 
 }  // namespace KO::LeaseWarrantyProvider

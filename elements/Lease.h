@@ -10,8 +10,6 @@ namespace KO::LeaseWarrantyProvider {
 /** What the design shared with the warranty element needs to know of leases. */
 struct LeaseElement {
     using Base = LeaseBase;
-    using Property = Properties::Lease;
-    static constexpr Property identifier = Property::InstanceID;
 
     static const TraceUnit unit;
     static const RecordElementTexts texts;

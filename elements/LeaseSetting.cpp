@@ -7,31 +7,8 @@ namespace KO::LeaseWarrantyProvider {
 
 std::string loggerLeaseSetting(LoggerNames::provider);
 
-namespace {
+const TraceUnit LeaseSettingElement::unit{loggerLeaseSetting, "LeaseSetting.cpp"};
 
-const TraceUnit unit{loggerLeaseSetting, "LeaseSetting.cpp"};
-
-}  // namespace
-
-LeaseSetting::LeaseSetting() {
-    traceMethod(at(unit));
-}
-
-LeaseSetting::~LeaseSetting() noexcept(false) {
-    traceMethod(at(unit));
-}
-
-Moniker LeaseSetting::getLeaseMoniker(Moniker& computerMoniker) {
-    // No exit line here, unlike everywhere else.
-    traceLine(at(unit, Level::error), MT_ENTERING, label::monikerComputer, &computerMoniker);
-    const CallSite site = at(unit);
-    return throwingOnlyDeclared([&] { return elementMoniker(site, instrumentation, element, computerMoniker); });
-}
-
-Moniker LeaseSetting::getComputerMoniker(Moniker& leaseMoniker) {
-    const Traced traced(at(unit, Level::error), label::monikerLease, &leaseMoniker);
-    const CallSite site = at(unit);
-    return throwingOnlyDeclared([&] { return computerMoniker(site, instrumentation, leaseMoniker); });
-}
+template class SettingElement<LeaseSettingElement>;
 
 }  // namespace KO::LeaseWarrantyProvider

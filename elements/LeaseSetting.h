@@ -1,38 +1,28 @@
 #pragma once
 
-#include "KO/Instrumentation.h"
-#include "KO/Moniker.h"
 #include "Lease.h"
+#include "SettingElement.h"
 
 namespace KO::LeaseWarrantyProvider {
 
-/**
- * The managed element of VELKO_LeaseSetting: tells which lease belongs to a computer, and back. The
- * lease of a computer has the text form of the computer's node path as its identifier.
- *
- * Monikers carry one key: a computer's "Name", a lease's "InstanceID"; others are ignored, and of the
- * argument only the selection changes. The operations throw InstrumentationException and
- * FrameworkException; any other exception in them ends the process.
- */
-class LeaseSetting {
-public:
-    LeaseSetting();
-    ~LeaseSetting() noexcept(false);
-    LeaseSetting(const LeaseSetting&) = delete;
-    LeaseSetting& operator=(const LeaseSetting&) = delete;
+/** What the design shared by the setting elements needs to know of leases. */
+struct LeaseSettingElement {
+    using Element = Lease;
+    static constexpr const char* constructor = "LeaseSetting";
+    static constexpr const char* destructor = "~LeaseSetting";
+    static constexpr const char* toElement = "getLeaseMoniker";
+    static constexpr bool toElementExits = false;  // unlike every other operation
+    static constexpr const char* elementLabel = " monikerLease=";
 
-    /**
-     * The moniker of a computer's lease, of which the own lease element is made to stand on it. A
-     * name that no computer bears gives the text of no node.
-     */
-    Moniker getLeaseMoniker(Moniker& computerMoniker);
-
-    /** The moniker of the computer to which a lease belongs. */
-    Moniker getComputerMoniker(Moniker& leaseMoniker);
-
-private:
-    Instrumentation instrumentation{};
-    Lease element{};
+    static const TraceUnit unit;
 };
+
+/** The managed element of VELKO_LeaseSetting: which lease belongs to a computer, and which computer to a lease. */
+class LeaseSetting : public SettingElement<LeaseSettingElement> {
+public:
+    Moniker getLeaseMoniker(Moniker& computerMoniker) { return getElementMoniker(computerMoniker); }
+};
+
+extern template class SettingElement<LeaseSettingElement>;
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -26,8 +26,7 @@ struct RecordElementTexts {
  * operator++ on. What it changes is seen by all at once, and the record file is rewritten when it ends.
  *
  * Policy gives:
- *   Base, Property     the record cursor and its property numbers
- *   identifier         the number of the identifier property
+ *   Base               the record cursor
  *   unit, texts        trace unit and RecordElementTexts of the element
  */
 template <class Policy>
@@ -61,7 +60,10 @@ public:
     /** Adds a filter and moves forward, from the current record on, to the first that passes all. */
     void setFilter(FilterType type, std::string reference);
 
-    /** Whether the current record passes all filters. Throws InstrumentationException when none is current. */
+    /**
+     * Whether the current record passes all filters. Throws InstrumentationException when an identifier
+     * is to be compared and no record is current.
+     */
     bool evaluate() const;
 
     /** Makes a record. @return true. Throws InstrumentationException when the identifier is taken. */
@@ -85,7 +87,7 @@ public:
     bool getInstanceID(std::string& value) const;
 
 protected:
-    using Property = typename Policy::Property;
+    using Property = typename Policy::Base::Property;
 
     /** Reads or writes a property of the current record under the name of the calling operation. */
     template <class Value>

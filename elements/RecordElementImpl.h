@@ -7,7 +7,6 @@
 #include "RecordElement.h"
 
 #include <algorithm>
-#include <utility>
 
 namespace KO::LeaseWarrantyProvider {
 
@@ -53,8 +52,8 @@ bool RecordElement<Policy>::evaluate() const {
             return true;
         }
         std::string identifier;
-        if (!base.getProperty(Policy::identifier, identifier)) {
-            fail<InstrumentationException>(at(Policy::unit, Level::error, "evaluate"), Policy::texts.identifierMissing);
+        if (!base.getProperty(Property::InstanceID, identifier)) {
+            fail<InstrumentationException>(at(Policy::unit, Level::flow, "evaluate"), Policy::texts.identifierMissing);
         }
         return identifier == filter.reference;
     };
@@ -100,7 +99,7 @@ bool RecordElement<Policy>::getChangeableType(unsigned short&) const {
 
 template <class Policy>
 bool RecordElement<Policy>::getInstanceID(std::string& value) const {
-    return get(at(Policy::unit), Policy::identifier, value);
+    return get(at(Policy::unit), Property::InstanceID, value);
 }
 
 template <class Policy>
@@ -114,7 +113,7 @@ void RecordElement<Policy>::remove() {
     const CallSite site = at(Policy::unit, Level::flow, Policy::texts.removeName);
     const Traced traced(site);
     if (!filterSet) {
-        fail<InstrumentationException>(site, Policy::texts.removeUnfiltered);
+        fail<InstrumentationException>(here(site), Policy::texts.removeUnfiltered);
     }
     base.remove();
 }

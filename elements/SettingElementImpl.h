@@ -1,12 +1,10 @@
 #pragma once
 
-// What the two setting elements share. Included by their source files and nowhere else, so that each
-// element's code and trace buffers stand in its own unit.
+// Definitions of SettingElement. Included by the source file of each setting element and nowhere else, so
+// that each element's code and trace buffers stand in its own unit.
 
 #include "Exceptions.h"
-#include "KO/Instrumentation.h"
-#include "KO/Moniker.h"
-#include "Trace.h"
+#include "SettingElement.h"
 
 #include <exception>
 #include <string>
@@ -43,7 +41,7 @@ std::string keyValue(const CallSite& site, Moniker& moniker, const std::string& 
             return value;
         }
     }
-    fail<FrameworkException>(site, keyMissing);
+    fail<FrameworkException>(here(site), keyMissing);
 }
 
 Moniker singleKeyMoniker(const char* name, const std::string& value) {
@@ -58,7 +56,7 @@ void selectComputer(const CallSite& site, Instrumentation& instrumentation, cons
     for (; instrumentation; ++instrumentation) {
         std::string name;
         if (!instrumentation.getProperty(NodeLexicon::PROPERTY_NAME, name)) {
-            fail<InstrumentationException>(site, "Name Property on Computer Node not available.");
+            fail<InstrumentationException>(here(site), "Name Property on Computer Node not available.");
         }
         if (name == wanted) {
             return;
@@ -66,32 +64,60 @@ void selectComputer(const CallSite& site, Instrumentation& instrumentation, cons
     }
 }
 
-/** From a computer to its lease or warranty. */
-template <class Element>
-Moniker elementMoniker(const CallSite& site, Instrumentation& instrumentation, Element& element,
-                       Moniker& computerMoniker) {
+}  // namespace
+
+template <class Policy>
+SettingElement<Policy>::SettingElement() {
+    traceMethod(at(Policy::unit, Level::flow, Policy::constructor));
+}
+
+template <class Policy>
+SettingElement<Policy>::~SettingElement() noexcept(false) {
+    traceMethod(at(Policy::unit, Level::flow, Policy::destructor));
+}
+
+template <class Policy>
+Moniker SettingElement<Policy>::getElementMoniker(Moniker& computerMoniker) {
+    const CallSite site = at(Policy::unit, Level::error, Policy::toElement);
+    const auto work = [&] { return toElement(at(Policy::unit, Level::flow, Policy::toElement), computerMoniker); };
+    if constexpr (Policy::toElementExits) {
+        const Traced traced(site, label::monikerComputer, &computerMoniker);
+        return throwingOnlyDeclared(work);
+    } else {
+        traceLine(site, MT_ENTERING, label::monikerComputer, &computerMoniker);
+        return throwingOnlyDeclared(work);
+    }
+}
+
+template <class Policy>
+Moniker SettingElement<Policy>::getComputerMoniker(Moniker& elementMoniker) {
+    const Traced traced(at(Policy::unit, Level::error), Policy::elementLabel, &elementMoniker);
+    const CallSite site = at(Policy::unit);
+    return throwingOnlyDeclared([&] { return toComputer(site, elementMoniker); });
+}
+
+template <class Policy>
+Moniker SettingElement<Policy>::toElement(const CallSite& site, Moniker& computerMoniker) {
     const std::string name = keyValue(site, computerMoniker, computerKey, "Could not find 'Name' Key in Moniker");
-    traceVariable(site, computerKey, name);
+    traceVariable(here(site), computerKey, name);
     selectComputer(site, instrumentation, name);
     const std::string instanceId = instrumentation.convertPathToString(instrumentation.getPathToNode());
-    element.setFilter(Element::InstanceIDFilter, instanceId);
-    traceVariable(site, elementKey, instanceId);
+    element.setFilter(Policy::Element::InstanceIDFilter, instanceId);
+    traceVariable(here(site), elementKey, instanceId);
     return singleKeyMoniker(elementKey, instanceId);
 }
 
-/** From a lease or warranty to its computer. */
-Moniker computerMoniker(const CallSite& site, Instrumentation& instrumentation, Moniker& elementMoniker) {
+template <class Policy>
+Moniker SettingElement<Policy>::toComputer(const CallSite& site, Moniker& elementMoniker) {
     const std::string instanceId =
         keyValue(site, elementMoniker, elementKey, "Could not find 'InstanceID' Key in Moniker");
     instrumentation.selectNode(instrumentation.convertStringToPath(instanceId));
     std::string name;
     if (!instrumentation.getProperty(NodeLexicon::PROPERTY_NAME, name)) {
-        fail<InstrumentationException>(site, "Name Property on computer not available.");
+        fail<InstrumentationException>(here(site), "Name Property on computer not available.");
     }
-    traceVariable(site, computerKey, name);
+    traceVariable(here(site), computerKey, name);
     return singleKeyMoniker(computerKey, name);
 }
-
-}  // namespace
 
 }  // namespace KO::LeaseWarrantyProvider

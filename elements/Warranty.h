@@ -10,8 +10,6 @@ namespace KO::LeaseWarrantyProvider {
 /** What the design shared with the lease element needs to know of warranties. */
 struct WarrantyElement {
     using Base = WarrantyBase;
-    using Property = Properties::Warranty;
-    static constexpr Property identifier = Property::InstanceID;
 
     static const TraceUnit unit;
     static const RecordElementTexts texts;

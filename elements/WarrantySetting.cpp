@@ -7,30 +7,8 @@ namespace KO::LeaseWarrantyProvider {
 
 std::string loggerWarrantySetting(LoggerNames::provider);
 
-namespace {
+const TraceUnit WarrantySettingElement::unit{loggerWarrantySetting, "WarrantySetting.cpp"};
 
-const TraceUnit unit{loggerWarrantySetting, "WarrantySetting.cpp"};
-
-}  // namespace
-
-WarrantySetting::WarrantySetting() {
-    traceMethod(at(unit));
-}
-
-WarrantySetting::~WarrantySetting() noexcept(false) {
-    traceMethod(at(unit));
-}
-
-Moniker WarrantySetting::getWarrantyMoniker(Moniker& computerMoniker) {
-    const Traced traced(at(unit, Level::error), label::monikerComputer, &computerMoniker);
-    const CallSite site = at(unit);
-    return throwingOnlyDeclared([&] { return elementMoniker(site, instrumentation, element, computerMoniker); });
-}
-
-Moniker WarrantySetting::getComputerMoniker(Moniker& warrantyMoniker) {
-    const Traced traced(at(unit, Level::error), label::monikerWarranty, &warrantyMoniker);
-    const CallSite site = at(unit);
-    return throwingOnlyDeclared([&] { return computerMoniker(site, instrumentation, warrantyMoniker); });
-}
+template class SettingElement<WarrantySettingElement>;
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -27,7 +27,7 @@ namespace KO {
 namespace Level {
 constexpr int error = 3000;   ///< failures, and the flow of control where an operator should see it
 constexpr int flow = 4000;    ///< the ordinary flow of control
-constexpr int detail = 6000;  ///< louder than the flow: one message of the asset data
+constexpr int detail = 6000;  ///< written only by a logger that is raised to it: one message of the asset data
 }  // namespace Level
 
 /** What all trace lines of a source unit share. */
@@ -48,6 +48,11 @@ struct CallSite {
 inline CallSite at(const TraceUnit& unit, int level = Level::flow, const char* function = __builtin_FUNCTION(),
                    unsigned int line = __builtin_LINE()) {
     return {&unit, level, function, line};
+}
+
+/** The place of the call itself, under the name and at the level of the function that it works for. */
+inline CallSite here(const CallSite& caller, unsigned int line = __builtin_LINE()) {
+    return {caller.unit, caller.level, caller.function, line};
 }
 
 namespace {
@@ -191,18 +196,12 @@ constexpr const char* filterType = " filterType=";
 constexpr const char* filterTypeBare = "FilterType=";
 constexpr const char* keyValue = " key_value=";
 constexpr const char* monikerComputer = " monikerComputer=";
-constexpr const char* monikerLease = " monikerLease=";
-constexpr const char* monikerWarranty = " monikerWarranty=";
 constexpr const char* broker = " _broker=";
 constexpr const char* context = " _context=";
 }  // namespace label
 
-}  // namespace
-
 /** The rule between which every request stands in the log. */
 constexpr const char* requestRule = "==============================================================================";
-
-namespace {
 
 /** Where the marker lines of a request are filed: the framework's trace header, at lines of its own. */
 constexpr const char* markerFile = "sdk/kolib/include/Trace.h";

@@ -65,12 +65,14 @@ std::string nameSpaceOf(const CMPIObjectPath* ref, CMPIStatus& status) {
 }
 
 /**
- * Runs an operation's body for the class of a path or of a name. What is thrown is only logged: the
- * object manager sees a success with whatever was returned before. Exceptions of other kinds than
- * std::exception leave the provider.
+ * Runs an operation's body for the class of a path or of a name, between the marks of the entry point.
+ * What is thrown is only logged: the object manager sees a success with whatever was returned before.
+ * Exceptions of other kinds than std::exception leave the provider. Only the status's code is
+ * answered: a message that a failing call of the broker put beside it is not the provider's.
  */
 template <class Class>
 CMPIStatus serve(const CallSite& site, Operation operation, Class requestedClass, Request& request) {
+    const EntryMarkers markers(site);
     try {
         const unsigned short classId = classIdOf(site, requestedClass);
         if (operation == Operation::createInstance) {
@@ -78,9 +80,9 @@ CMPIStatus serve(const CallSite& site, Operation operation, Class requestedClass
         }
         bodyOf(operation, classId)(request);
     } catch (const std::exception& failure) {
-        traceMessage({site.unit, Level::error, site.function, site.line}, failure.what());
+        traceMessage(at(unit, Level::error, site.function), failure.what());
     }
-    return request.status;
+    return {request.status.rc, nullptr};
 }
 
 /** The answer of an operation that is only noted. */
@@ -95,28 +97,24 @@ CMPIStatus LeaseAndWarranty_Cleanup(CMPIInstanceMI*, const CMPIContext*, CMPIBoo
 
 CMPIStatus LeaseAndWarranty_EnumInstanceNames(CMPIInstanceMI*, const CMPIContext* ctx, const CMPIResult* result,
                                               const CMPIObjectPath* ref) {
-    const EntryMarkers markers(at(unit));
     Request request{broker, ctx, result, ref};
     return serve(at(unit), Operation::enumInstanceNames, ref, request);
 }
 
 CMPIStatus LeaseAndWarranty_EnumInstances(CMPIInstanceMI*, const CMPIContext* ctx, const CMPIResult* result,
                                           const CMPIObjectPath* ref, const char** properties) {
-    const EntryMarkers markers(at(unit));
     Request request{broker, ctx, result, ref, properties};
     return serve(at(unit), Operation::enumInstances, ref, request);
 }
 
 CMPIStatus LeaseAndWarranty_GetInstance(CMPIInstanceMI*, const CMPIContext* ctx, const CMPIResult* result,
                                         const CMPIObjectPath* ref, const char** properties) {
-    const EntryMarkers markers(at(unit));
     Request request{broker, ctx, result, ref, properties};
     return serve(at(unit), Operation::getInstance, ref, request);
 }
 
 CMPIStatus LeaseAndWarranty_CreateInstance(CMPIInstanceMI*, const CMPIContext* ctx, const CMPIResult* result,
                                            const CMPIObjectPath* ref, const CMPIInstance*) {
-    const EntryMarkers markers(at(unit));
     Request request{broker, ctx, result, ref};
     return serve(at(unit), Operation::createInstance, ref, request);
 }
@@ -124,14 +122,12 @@ CMPIStatus LeaseAndWarranty_CreateInstance(CMPIInstanceMI*, const CMPIContext* c
 CMPIStatus LeaseAndWarranty_ModifyInstance(CMPIInstanceMI*, const CMPIContext* ctx, const CMPIResult* result,
                                            const CMPIObjectPath* ref, const CMPIInstance* inst,
                                            const char** properties) {
-    const EntryMarkers markers(at(unit));
     Request request{broker, ctx, result, ref, properties, inst};
     return serve(at(unit), Operation::modifyInstance, ref, request);
 }
 
 CMPIStatus LeaseAndWarranty_DeleteInstance(CMPIInstanceMI*, const CMPIContext* ctx, const CMPIResult* result,
                                            const CMPIObjectPath* ref) {
-    const EntryMarkers markers(at(unit));
     Request request{broker, ctx, result, ref};
     return serve(at(unit), Operation::deleteInstance, ref, request);
 }
@@ -148,7 +144,6 @@ CMPIStatus LeaseAndWarranty_AssociationCleanup(CMPIAssociationMI*, const CMPICon
 CMPIStatus LeaseAndWarranty_Associators(CMPIAssociationMI*, const CMPIContext* ctx, const CMPIResult* result,
                                         const CMPIObjectPath* ref, const char* assocClass, const char*, const char*,
                                         const char*, const char** properties) {
-    const EntryMarkers markers(at(unit));
     Request request{broker, ctx, result, ref, properties};
     return serve(at(unit), Operation::associators, assocClass, request);
 }
@@ -156,7 +151,6 @@ CMPIStatus LeaseAndWarranty_Associators(CMPIAssociationMI*, const CMPIContext* c
 CMPIStatus LeaseAndWarranty_AssociatorNames(CMPIAssociationMI*, const CMPIContext* ctx, const CMPIResult* result,
                                             const CMPIObjectPath* ref, const char* assocClass, const char*, const char*,
                                             const char*) {
-    const EntryMarkers markers(at(unit));
     Request request{broker, ctx, result, ref};
     return serve(at(unit), Operation::associatorNames, assocClass, request);
 }

@@ -10,8 +10,7 @@ namespace KO::LeaseWarrantyProvider {
 struct LeaseStore;
 
 /**
- * The terms of one lease. Money amounts are text, exactly as the client gave them; nothing here
- * interprets them.
+ * The terms of one lease. Money amounts are text; nothing here interprets them.
  */
 struct LeaseUnit : private RecordTrace<LeaseStore> {
     LeaseUnit() = default;
@@ -36,7 +35,7 @@ struct LeaseUnit : private RecordTrace<LeaseStore> {
 /** Reads one record of a lease file from where the stream stands. A field that cannot be read keeps its value. */
 std::ifstream& operator>>(std::ifstream& source, LeaseUnit& lease);
 
-/** Writes one record of a lease file: thirteen lines, each flushed. */
+/** Writes one record of a lease file: thirteen fields, one a line, each flushed. */
 std::ofstream& operator<<(std::ofstream& target, const LeaseUnit& lease);
 
 }  // namespace KO::LeaseWarrantyProvider

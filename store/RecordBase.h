@@ -3,6 +3,7 @@
 #include "Trace.h"
 
 #include <cstddef>
+#include <exception>
 #include <limits>
 #include <string>
 #include <vector>
@@ -132,6 +133,7 @@ private:
 
     bool cacheModified = false;
     std::size_t cursor = end;
+    int exceptionsBefore = std::uncaught_exceptions();  ///< on their way when this cursor was made
 };
 
 }  // namespace KO::LeaseWarrantyProvider

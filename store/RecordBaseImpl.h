@@ -1,7 +1,7 @@
 #pragma once
 
-// Definitions of RecordBase. Included by the source file of each store and nowhere else, so that each
-// store's code and trace buffers stand in its own unit.
+// Definitions of RecordBase, RecordCache and RecordTrace. Included by the source file of each store and nowhere else,
+// so that each store's code and trace buffers stand in its own unit.
 
 #include "Exceptions.h"
 #include "RecordBase.h"
@@ -10,7 +10,6 @@
 
 #include <algorithm>
 #include <exception>
-#include <utility>
 
 namespace KO::LeaseWarrantyProvider {
 
@@ -46,9 +45,10 @@ RecordCache<Policy>::RecordCache() noexcept {
     const Traced traced(at(Policy::unit, Level::flow, Policy::texts.cacheName));
     try {
         loadRecords(dataFilePath(Policy::texts.fileName), this->count(), table);
-    } catch (const std::exception&) {
+    } catch (const std::exception& failure) {
         this->count() = 0;
         table.clear();
+        traceMessage(at(Policy::unit, Level::error, Policy::texts.cacheName), failure.what());
     }
 }
 
@@ -76,7 +76,7 @@ RecordBase<Policy>::RecordBase() {
     }
     skipTo(0);
     if (cursor == end) {
-        fail<InstrumentationException>(at(Policy::unit, Level::error, Policy::texts.baseName), Policy::texts.noRecords);
+        fail<InstrumentationException>(at(Policy::unit, Level::flow, Policy::texts.baseName), Policy::texts.noRecords);
     }
 }
 
@@ -84,7 +84,7 @@ template <class Policy>
 RecordBase<Policy>::~RecordBase() noexcept(false) {
     const CallSite site = at(Policy::unit, Level::flow, Policy::texts.baseDestructorName);
     const Traced traced(site);
-    traceVariable(site, "cacheModified", cacheModified ? 1U : 0U);
+    traceVariable(here(site), "cacheModified", cacheModified ? 1U : 0U);
     if (cacheModified) {
         rewrite(site);
     }
@@ -105,10 +105,10 @@ void RecordBase<Policy>::rewrite(const CallSite& site) {
         Policy::cache().flushCache();
         cacheModified = false;
     } catch (const std::exception& failure) {
-        if (std::uncaught_exceptions() == 0) {
+        if (std::uncaught_exceptions() == exceptionsBefore) {
             throw;
         }
-        traceMessage({site.unit, Level::error, site.function, site.line}, failure.what());
+        traceMessage(at(*site.unit, Level::error, site.function), failure.what());
     }
 }
 
@@ -145,7 +145,7 @@ bool RecordBase<Policy>::create(const std::string& instanceId) {
     auto& cache = Policy::cache();
     const auto taken = [&](const Unit& unit) { return unit.inUse && unit.InstanceID == instanceId; };
     if (std::any_of(cache.table.begin(), cache.table.end(), taken)) {
-        fail<InstrumentationException>(site, Policy::texts.identifierExists);
+        fail<InstrumentationException>(here(site), Policy::texts.identifierExists);
     }
     const bool stoodOnEntry = cursor != end;
     cache.table.push_back(Unit(instanceId));
@@ -162,11 +162,12 @@ template <class Policy>
 void RecordBase<Policy>::remove() {
     const CallSite site = at(Policy::unit, Level::flow, Policy::texts.removeName);
     const Traced traced(site);
-    requireCurrent(site);
+    requireCurrent(here(site));
     auto& cache = Policy::cache();
+    // A record that this cursor, which does not move, has deleted already is not counted down again.
+    cache.count() -= cache.table[cursor].inUse ? 1U : 0U;
     cache.table[cursor].inUse = false;
-    --cache.count();
-    traceVariable(site, Policy::texts.countName, cache.count());
+    traceVariable(here(site), Policy::texts.countName, cache.count());
     cacheModified = true;
 }
 

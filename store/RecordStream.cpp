@@ -11,11 +11,13 @@ constexpr const char* emptyValue = "*";
 
 /** Reads into a scratch value, since a failed extraction would overwrite a number with 0. */
 template <class Value>
-void extractOrKeep(std::istream& stream, Value& value) {
+bool extractOrKeep(std::istream& stream, Value& value) {
     Value read{};
-    if (stream >> read) {
-        value = read;
+    if (!(stream >> read)) {
+        return false;
     }
+    value = read;
+    return true;
 }
 
 std::string replaced(std::string text, char from, char to) {
@@ -25,19 +27,19 @@ std::string replaced(std::string text, char from, char to) {
 
 }  // namespace
 
-void extract(std::istream& stream, unsigned int& number) {
+bool extract(std::istream& stream, unsigned int& number) {
     if (std::isdigit((stream >> std::ws).peek()) == 0) {
         stream.setstate(std::ios::failbit);
     }
-    extractOrKeep(stream, number);
+    return extractOrKeep(stream, number);
 }
 
-void extract(std::istream& stream, bool& flag) {
-    extractOrKeep(stream, flag);
+bool extract(std::istream& stream, bool& flag) {
+    return extractOrKeep(stream, flag);
 }
 
-void extract(std::istream& stream, std::string& word) {
-    stream >> word;
+bool extract(std::istream& stream, std::string& word) {
+    return extractOrKeep(stream, word);
 }
 
 std::string escaped(const std::string& text, TextForm form) {

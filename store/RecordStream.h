@@ -8,17 +8,14 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-/**
- * Reads an unsigned decimal number. Where none stands, the stream fails and the number stays as it
- * was; a sign makes it no unsigned number.
+/** @name Reading a field
+ * Answers whether the field was there. Where it was not, the stream fails and the value stays as it was.
  */
-void extract(std::istream& stream, unsigned int& number);
-
-/** Reads a flag, "0" or "1". Where none stands, the stream fails and the flag stays as it was. */
-void extract(std::istream& stream, bool& flag);
-
-/** Reads a word. Where none stands, the stream fails and the text stays as it was. */
-void extract(std::istream& stream, std::string& word);
+///@{
+bool extract(std::istream& stream, unsigned int& number);  ///< decimal; a sign makes it no unsigned number
+bool extract(std::istream& stream, bool& flag);            ///< 0 or 1
+bool extract(std::istream& stream, std::string& word);
+///@}
 
 /** What a line of a record file holds for a text. */
 std::string escaped(const std::string& text, TextForm form);
@@ -29,17 +26,14 @@ std::string unescaped(const std::string& line, TextForm form);
 /** Ends a line and hands it to the operating system: a record file is flushed line by line. */
 void endLine(std::ostream& stream);
 
-/**
- * Reads the fields of a record in the table's order, then undoes the escapes of its texts. The
- * stream's state is not looked at: a field that cannot be read stays as it was.
+/** Reads a record's fields in the table's order, undoing the escapes of its texts. What cannot be read stays as it was.
  */
 template <class Unit, class Fields>
 void readRecord(std::istream& stream, Unit& unit, const Fields& fields) {
     for (const auto& field : fields) {
-        std::visit([&](auto member) { extract(stream, unit.*member); }, field.member);
-    }
-    for (const auto& field : fields) {
-        if (const auto* text = std::get_if<std::string Unit::*>(&field.member)) {
+        const bool wasThere = std::visit([&](auto member) { return extract(stream, unit.*member); }, field.member);
+        const auto* text = std::get_if<std::string Unit::*>(&field.member);
+        if (wasThere && text != nullptr) {
             unit.** text = unescaped(unit.**text, field.form);
         }
     }

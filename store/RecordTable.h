@@ -48,6 +48,9 @@ void loadRecords(const std::string& path, unsigned int& count, std::vector<Unit>
     }
     unsigned int declared = 0;
     extract(stream, declared);
+    if (declared == 0) {
+        return;
+    }
     const std::size_t room = std::size_t{2} * declared;
     if (declared > reservedRecords) {
         if (!memoryCanHold(room, sizeof(Unit))) {

@@ -24,7 +24,7 @@ struct WarrantyUnit : private RecordTrace<WarrantyStore> {
 /** Reads one record of a warranty file from where the stream stands. A field that cannot be read keeps its value. */
 std::ifstream& operator>>(std::ifstream& source, WarrantyUnit& warranty);
 
-/** Writes one record of a warranty file: four lines, each flushed. */
+/** Writes one record of a warranty file: four fields, one a line, each flushed. */
 std::ofstream& operator<<(std::ofstream& target, const WarrantyUnit& warranty);
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -13,7 +13,7 @@ namespace testsupport {
 
 /** Everything that a provider did in answer to one call. */
 struct Outcome {
-    CMPIrc rc = CMPI_RC_OK;
+    int rc = CMPI_RC_OK;
     bool hasMessage = false;         ///< whether the status' message pointer was not null
     std::string message{};           ///< its text
     bool threw = false;              ///< an exception left the provider; rc is then CMPI_RC_ERR_FAILED

@@ -106,9 +106,14 @@ inline const void* tableOfCall() {
     return nullptr;
 }
 
+/** As brokers do, a call that fails tells why in words. */
+inline CMPIStatus orderedStatus(CMPIrc rc) {
+    return cimhost::toCmpi({rc, rc == CMPI_RC_OK ? std::string{} : "ordered by the test"});
+}
+
 inline void setStatus(CMPIStatus* status, CMPIrc rc) {
     if (status != nullptr) {
-        *status = {rc, nullptr};
+        *status = orderedStatus(rc);
     }
 }
 
@@ -119,7 +124,7 @@ void setStatus(const Other&, CMPIrc) {}
 template <class Result>
 Result emptyAnswer(const Verdict& verdict) {
     if constexpr (std::is_same_v<Result, CMPIStatus>) {
-        return {verdict.rc, nullptr};
+        return orderedStatus(verdict.rc);
     } else if constexpr (std::is_same_v<Result, CMPIData>) {
         CMPIData data{};
         data.state = verdict.rc == CMPI_RC_OK ? CMPI_nullValue : CMPI_badValue;
