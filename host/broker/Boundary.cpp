@@ -6,7 +6,7 @@
 namespace cimhost {
 
 CMPIStatus toCmpi(const Status& status) noexcept {
-    CMPIStatus answer{status.rc, nullptr};
+    CMPIStatus answer{static_cast<CMPIrc>(status.rc), nullptr};
     Arena* arena = status.message.empty() ? nullptr : Broker::arenaOfThread();
     if (arena != nullptr) {
         try {

@@ -17,7 +17,7 @@ namespace cimhost {
 /** Ends a table function with a status other than OK. */
 class Failure {
 public:
-    explicit Failure(CMPIrc rc, std::string message = {}) : reason{rc, std::move(message)} {}
+    explicit Failure(int rc, std::string message = {}) : reason{rc, std::move(message)} {}
     explicit Failure(Status status) : reason(std::move(status)) {}
 
     const Status& status() const { return reason; }

@@ -41,6 +41,7 @@ CMPIInstance* newInstance(const CMPIBroker* broker, const CMPIObjectPath* path, 
         content.shape = owner.classShape(content.value.path.className);
         if (content.shape) {
             content.value.properties = keyProperties(content.value.path, *content.shape);
+            content.given = content.value.properties.size();
         }
         return owner.arena().make<CMPIInstance>(std::move(content));
     });

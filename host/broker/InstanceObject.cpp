@@ -43,6 +43,18 @@ void checkAgainstClass(const ClassShape* shape, const std::string& name, const V
     }
 }
 
+/** A property that the broker put in itself gives up its place: the order is that in which the provider sets. */
+void withdrawGiven(InstanceContent& target, const std::string& name) {
+    auto& values = target.value.properties;
+    const auto end = values.begin() + static_cast<std::ptrdiff_t>(target.given);
+    const auto found =
+        std::find_if(values.begin(), end, [&](const NamedValue& each) { return sameName(each.name, name); });
+    if (found != end) {
+        values.erase(found);
+        --target.given;
+    }
+}
+
 CMPIStatus setProperty(const CMPIInstance* instance, const char* name, const CMPIValue* value, CMPIType type) {
     return guarded([&] {
         InstanceContent& target = content(instance);
@@ -53,6 +65,7 @@ CMPIStatus setProperty(const CMPIInstance* instance, const char* name, const CMP
         Value converted = valueFrom(value, type);
         checkAgainstClass(target.shape.get(), property, converted);
         if (accepts(target, property)) {
+            withdrawGiven(target, property);
             setNamed(target.value.properties, property, std::move(converted));
         }
     });

@@ -1,5 +1,7 @@
 #include "broker/RequestScope.h"
 
+#include <cstring>
+
 namespace cimhost {
 
 RequestScope::RequestScope(Broker& itsBroker) : broker(itsBroker), objects(itsBroker.tables(), &itsBroker.lasting()) {
@@ -27,8 +29,12 @@ CMPIResult* RequestScope::result(ResultEvents& events) {
 }
 
 Status statusFrom(const CMPIStatus& status) {
+    // Read as the number that it is: an enumeration must not be loaded with a value that it cannot have.
+    static_assert(sizeof status.rc == sizeof(int));
+    int rc = CMPI_RC_OK;
+    std::memcpy(&rc, &status.rc, sizeof rc);
     const auto* message = objectOf(status.msg);
-    return {status.rc, message == nullptr ? std::string{} : *message->content};
+    return {rc, message == nullptr ? std::string{} : *message->content};
 }
 
 }  // namespace cimhost

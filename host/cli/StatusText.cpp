@@ -50,7 +50,7 @@ std::string oneLine(const std::string& text) {
 
 }  // namespace
 
-std::string codeName(CMPIrc code) {
+std::string codeName(int code) {
     for (const Row& row : codes) {
         if (row.code == code) {
             return row.name;

@@ -6,9 +6,12 @@
 
 namespace cimhost {
 
-/** How an operation ended: a CIM status code and, where there is something to say, a text for people. */
+/**
+ * How an operation ended: a CIM status code and, where there is something to say, a text for people.
+ * The code is a plain number, since a provider may answer one that is no CMPIrc.
+ */
 struct Status {
-    CMPIrc rc = CMPI_RC_OK;
+    int rc = CMPI_RC_OK;
     std::string message{};
 
     bool ok() const { return rc == CMPI_RC_OK; }

@@ -59,7 +59,7 @@ Interface* createInterface(const LoadedLibrary& library, const std::string& prov
 }
 
 template <class Interface>
-CMPIrc cleanUp(Interface* interface, Broker& broker, bool terminating) {
+int cleanUp(Interface* interface, Broker& broker, bool terminating) {
     if (interface->ft->cleanup == nullptr) {
         return CMPI_RC_OK;
     }
@@ -71,7 +71,7 @@ CMPIrc cleanUp(Interface* interface, Broker& broker, bool terminating) {
 
 template CMPIInstanceMI* createInterface(const LoadedLibrary&, const std::string&, Broker&, const CMPIBroker*);
 template CMPIAssociationMI* createInterface(const LoadedLibrary&, const std::string&, Broker&, const CMPIBroker*);
-template CMPIrc cleanUp(CMPIInstanceMI*, Broker&, bool);
-template CMPIrc cleanUp(CMPIAssociationMI*, Broker&, bool);
+template int cleanUp(CMPIInstanceMI*, Broker&, bool);
+template int cleanUp(CMPIAssociationMI*, Broker&, bool);
 
 }  // namespace cimhost

@@ -47,6 +47,6 @@ Interface* createInterface(const LoadedLibrary& library, const std::string& prov
  * @return the provider's status code; CMPI_RC_ERR_FAILED when it throws, CMPI_RC_OK when it has no such function
  */
 template <class Interface>
-CMPIrc cleanUp(Interface* interface, Broker& broker, bool terminating);
+int cleanUp(Interface* interface, Broker& broker, bool terminating);
 
 }  // namespace cimhost

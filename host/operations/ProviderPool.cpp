@@ -51,7 +51,7 @@ void ProviderPool::end(Provider& provider, Interface* interface) {
     if (interface == nullptr) {
         return;
     }
-    const CMPIrc answer = cleanUp(interface, broker, true);
+    const int answer = cleanUp(interface, broker, true);
     if (answer == CMPI_RC_DO_NOT_UNLOAD || answer == CMPI_RC_NEVER_UNLOAD) {
         provider.library->keep();
     }
