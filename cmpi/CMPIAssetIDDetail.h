@@ -21,7 +21,10 @@ struct AssetClass {
     static const std::array<KeyFilter<AssetIDDetails>, 4> filters;
     static const std::array<PropertyRow<AssetIDDetails>, 24> properties;
 
-    /** Takes the modifiable properties that the instance has, and writes the asset file whatever was read of it. */
+    /**
+     * Takes the modifiable properties that the instance has, and writes the asset file, whatever was read of
+     * it and whether or not the path's keys select a computer.
+     */
     static void modify(AssetIDDetails& details, const CMPIInstance* instance);
 };
 

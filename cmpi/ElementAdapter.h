@@ -15,7 +15,7 @@ namespace KO::LeaseWarrantyProvider {
 template <class Policy>
 class ElementAdapter {
 public:
-    /** All that the element has, without regard to keys. */
+    /** Stands on the first of all that the element has. */
     ElementAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext, std::string requestNameSpace);
 
     /** Destroys the element, which may throw where its destructor does. */
@@ -32,7 +32,7 @@ public:
 protected:
     using Element = typename Policy::Element;
 
-    /** What the path's keys select: narrow makes the element's filters of them. */
+    /** Stands on the first of what the path's keys select: narrow makes filters of the element of them. */
     ElementAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext, const CMPIObjectPath* path,
                    void (*narrow)(Element& element, const CMPIObjectPath* path));
 

@@ -9,7 +9,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-/** One key of a class: its name, and how its value is read into a text. A value that is not there leaves the text. */
+/** One key of a class: its name, and how its value is read into a text. Without a value the text stays as it was. */
 template <class Element>
 struct KeyRow {
     const char* name;
@@ -57,7 +57,10 @@ public:
     /** Makes filters of the path's keys. May throw what the element's filters throw. */
     void setObjectPath(const CMPIObjectPath* path);
 
-    /** Path of the current instance; null when it cannot be made. */
+    /**
+     * Path of the current instance; null when it cannot be made. A key without a value has that of the key
+     * before it.
+     */
     CMPIObjectPath* getObjectPath();
 
     /** The current instance; null when it cannot be made. */

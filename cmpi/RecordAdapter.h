@@ -21,7 +21,7 @@ namespace KO::LeaseWarrantyProvider {
 template <class Policy>
 class RecordAdapter : public ElementAdapter<Policy> {
 public:
-    /** For creation: all records. */
+    /** For creation, and as the end of an association: all records. */
     using ElementAdapter<Policy>::ElementAdapter;
 
     /**
@@ -40,16 +40,20 @@ public:
     CMPIInstance* getCMPIInstance(const char** properties);
 
     /**
-     * Makes a record with the path's key and default values, and stands on it.
-     * @return its instance; null when the path has no key, and nothing was made, or when the instance of
-     *     the new record cannot be made
+     * Makes a record with the path's key and default values, and stands on it. Throws what the element's
+     * creation throws, as when the key is taken.
+     * @return its instance; null when the path has no key that is text, and nothing was made, or when the
+     *     instance of the new record cannot be made
      */
     CMPIInstance* createCMPIInstance(const CMPIObjectPath* desiredObjectPath);
 
-    /** Writes the instance's modifiable properties into the current record; a null instance changes nothing. */
+    /**
+     * Writes the instance's modifiable properties into the current record; a null instance changes nothing.
+     * Throws what the element's setters throw, as when no record is current.
+     */
     void modifyCMPIInstance(const CMPIInstance* referenceInstance, const char** properties);
 
-    /** Removes the current record. */
+    /** Removes the current record. Throws what the element's removal throws, as when no key named a record. */
     void deleteCMPIInstance();
 
 private:

@@ -12,9 +12,10 @@ namespace KO::LeaseWarrantyProvider {
  * The adapter of an association between a computer system, its "Antecedent", and a lease or warranty,
  * its "Dependent": the design that CMPILeaseSetting and CMPIWarrantySetting share.
  *
- * The class of the request's path decides what it is: of the association, a list of association
- * instances; of the computer system, the list of the computer's leases or warranties; of the lease or
- * warranty, the list of its computers. With a path of any other class it yields nothing.
+ * The class of the request's path decides what it is. Of the association: a list of association
+ * instances. Of the computer system: the computer's lease or warranty, or all of them for a path without
+ * keys. Of the lease or warranty: all computers that the object manager knows but the last, whichever of
+ * them it belongs to. With a path of any other class it yields nothing.
  *
  * Policy gives:
  *   Element, Setting                    adapter of the lease or warranty, and element of the association
@@ -27,7 +28,7 @@ namespace KO::LeaseWarrantyProvider {
 template <class Policy>
 class SettingAdapter {
 public:
-    /** Positioned by the path's class. May throw what its parts throw. */
+    /** Positioned by the path's class. May throw what its parts throw, as when there is no computer system. */
     SettingAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext, const CMPIObjectPath* path);
     ~SettingAdapter() noexcept(false);
     SettingAdapter(const SettingAdapter&) = delete;
@@ -35,7 +36,9 @@ public:
 
     /**
      * Whether the walk goes on. As the computer end looks one ahead, a walk over computers leaves out
-     * the last one, and an association list pairs the first computer with every lease or warranty.
+     * the last one. An association list pairs the first computer with every lease or warranty; these then
+     * stay at their end, so that each further computer but the last follows with a "Dependent" without
+     * keys, and so does the first where there is no lease or warranty and it is not the last.
      */
     operator bool();
 
@@ -54,10 +57,10 @@ public:
     /** The current far end; null when there is none. */
     CMPIInstance* getAssociator(const char** properties);
 
-    /** Path of a computer's lease or warranty; without key if the computer's path has none. */
+    /** Path that a computer's lease or warranty would have; without keys if the computer's path has none. */
     CMPIObjectPath* locateElement(const CMPIObjectPath* computerPath);
 
-    /** Path of the computer of a lease or warranty; without key if that path has none. */
+    /** Path of the computer of a lease or warranty; without keys if that path has none. */
     CMPIObjectPath* locateComputer(const CMPIObjectPath* elementPath);
 
 private:

@@ -28,8 +28,9 @@ namespace KO::LeaseWarrantyProvider {
  * data are the same for each. They are read whole when the element is made and are a snapshot from
  * then on; setters change the snapshot, and flushAssetData writes it back whole.
  *
- * Nothing here throws on account of the file. When it could not be read, the getters of stored values
- * answer false.
+ * Nothing here throws on account of the file or its lock: a failure is logged and swallowed. When the
+ * file could not be read, the getters of stored values answer false. What the framework throws otherwise,
+ * as when the cursors are made, a node is read or a date converted, is let through.
  */
 class AssetIDDetails {
 public:
@@ -53,7 +54,10 @@ public:
     /** How many personalized pairs are kept. */
     static constexpr std::size_t pairCount = 5;
 
-    /** Reads the file, which is created, empty, if there is none, and stands on the first computer node. */
+    /**
+     * Reads the file, which is created, empty, if there is none, and stands on the first computer node.
+     * Without a computer or a system node nothing is read.
+     */
     AssetIDDetails();
     /** The file is not written. */
     ~AssetIDDetails();
@@ -75,7 +79,7 @@ public:
     /** Writes the snapshot to the file. A failure is only logged. */
     void flushAssetData();
 
-    /** Path of the file, which is created if there is none; a failure is only logged. */
+    /** Path of the file, which is created, empty, if there is none; a failure is only logged. */
     std::wstring getFileName();
 
     /** @name Stored values
@@ -99,7 +103,7 @@ public:
     ///@}
 
     /** @name Values of the computer
-     * Answer whether the instrumentation has them.
+     * Answer whether the instrumentation has them; where it does not, the argument stays as it was.
      */
     ///@{
     bool getCSName(std::string& value) const;  ///< the computer's name
@@ -108,7 +112,8 @@ public:
 
     /**
      * The product's name without its suffix: of "name - suffix", what stands before the blank and the
-     * dash. A name without a dash leaves the argument as it was; the answer is true all the same.
+     * first dash, whatever the character in the blank's place is. A name that begins with the dash is
+     * given whole. A name without a dash leaves the argument as it was; the answer is true all the same.
      */
     bool getProductName(std::string& value) const;
     ///@}
@@ -117,7 +122,7 @@ public:
     std::string getVersion() const;            ///< the agent product's version
     std::string getCaption() const;
     std::string getDescription() const;
-    unsigned int getAssetIDStringArea() const;  ///< room for asset texts, in bytes
+    unsigned int getAssetIDStringArea() const;  ///< room for asset texts, in bytes: always 1024
     std::string getLocalDateTime() const;       ///< the present time, as CIM datetime text
 
     /** @name Changes of the snapshot

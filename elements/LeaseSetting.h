@@ -5,7 +5,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-/** What the design shared by the setting elements needs to know of leases. */
+/** What the design that the setting elements share needs to know of leases. */
 struct LeaseSettingElement {
     using Element = Lease;
     static constexpr const char* constructor = "LeaseSetting";
@@ -17,7 +17,7 @@ struct LeaseSettingElement {
     static const TraceUnit unit;
 };
 
-/** The managed element of VELKO_LeaseSetting: which lease belongs to a computer, and which computer to a lease. */
+/** The managed element of VELKO_LeaseSetting: which lease a computer has, and which computer has a lease. */
 class LeaseSetting : public SettingElement<LeaseSettingElement> {
 public:
     Moniker getLeaseMoniker(Moniker& computerMoniker) { return getElementMoniker(computerMoniker); }

@@ -28,7 +28,7 @@ public:
     /** Moves past the agent, for good. */
     void operator++();
 
-    /** Throws InstrumentationException when the value, compared byte for byte, is not this agent's. */
+    /** Changes nothing, but throws InstrumentationException when the value, byte for byte, is not this agent's. */
     void setFilter(FilterType type, std::string value) const;
 
     /** Display name: the product's name, with a suffix where the installation carries the marker file. */

@@ -22,8 +22,8 @@ struct RecordElementTexts {
  * An element over a record store: it walks the records in table order, narrowed by filters, and
  * gives access to the current one. The design that Lease and Warranty share.
  *
- * One is made for a request. It stands on the first record then; filters count from setFilter and
- * operator++ on. What it changes is seen by all at once, and the record file is rewritten when it ends.
+ * One is made for a request. It then stands on the first record; only setFilter and operator++ look at
+ * the filters. What it changes is seen by all at once, and the record file is rewritten when it ends.
  *
  * Policy gives:
  *   Base               the record cursor
@@ -69,7 +69,7 @@ public:
     /** Makes a record. @return true. Throws InstrumentationException when the identifier is taken. */
     bool create(std::string instanceId);
 
-    /** Removes the current record. Throws InstrumentationException when no filter was set or no record is current. */
+    /** Removes the current record. Throws InstrumentationException when no filter was set, or at the end. */
     void remove();
 
     /** @name Properties that every record has alike

@@ -11,9 +11,11 @@ namespace KO::LeaseWarrantyProvider {
  * and back. A record belongs to the computer whose node path, in text form, is the record's identifier.
  * The design that LeaseSetting and WarrantySetting share.
  *
- * Monikers carry one key: a computer's "Name", a record's "InstanceID"; others are ignored, and of the
- * argument only the selection changes. The operations throw InstrumentationException and
- * FrameworkException; any other exception in them ends the process.
+ * The moniker of a computer has the key "Name", that of a record the key "InstanceID", each spelled so;
+ * other keys are ignored, and of the argument only the selection changes. The operations throw
+ * FrameworkException for a moniker without its key and InstrumentationException for a node that has no
+ * name, or is not there where a record tells its place. Of what arises below them they let these two
+ * classes out; any other exception ends the process.
  *
  * Policy gives:
  *   Element                          the element of the records
@@ -30,13 +32,13 @@ public:
     SettingElement(const SettingElement&) = delete;
     SettingElement& operator=(const SettingElement&) = delete;
 
-    /** The moniker of the computer to which a record belongs. */
+    /** The moniker of the computer to which a record belongs, whether or not there is such a record. */
     Moniker getComputerMoniker(Moniker& elementMoniker);
 
 protected:
     /**
-     * The moniker of a computer's record. The setting's own element then stands on that record, if there
-     * is one. A name that no computer bears gives the text of no node.
+     * The moniker of a computer's record, whether or not there is one. The setting's own element then
+     * stands on that record, or at the end. For a name that no computer bears it is the text of no node.
      */
     Moniker getElementMoniker(Moniker& computerMoniker);
 

@@ -5,7 +5,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-/** What the design shared by the setting elements needs to know of warrantys. */
+/** What the design that the setting elements share needs to know of warranties. */
 struct WarrantySettingElement {
     using Element = Warranty;
     static constexpr const char* constructor = "WarrantySetting";
@@ -17,8 +17,7 @@ struct WarrantySettingElement {
     static const TraceUnit unit;
 };
 
-/** The managed element of VELKO_WarrantySetting: which warranty belongs to a computer, and which computer to a
- * warranty. */
+/** The managed element of VELKO_WarrantySetting: which warranty a computer has, and which computer has a warranty. */
 class WarrantySetting : public SettingElement<WarrantySettingElement> {
 public:
     Moniker getWarrantyMoniker(Moniker& computerMoniker) { return getElementMoniker(computerMoniker); }

@@ -10,19 +10,21 @@
  * What an adapter offers to the entry points. There is one adapter a CIM class: an iterator over the
  * instances that a request's object path selects, translating between CMPI and the managed element.
  *
- * It is constructed on the entry point's stack from (broker, context, object path), standing on the
- * first selected instance, and lives for one request. Broker and context are borrowed. The paths and
- * instances that it hands out belong to the object manager, and are null when they cannot be made.
+ * It is constructed on the entry point's stack from (broker, context, object path), stands on the first
+ * selected instance, if there is one, and lives for one request. Broker and context are borrowed. The
+ * paths and instances that it hands out belong to the object manager, and are null when they cannot be
+ * made.
  * Any operation may throw an exception derived from std::exception; so may the destructor, when a
  * change cannot be written.
  *
  * Every adapter has:
- *   operator bool()                  stands on an instance, or for other reasons wants the loop to go on
+ *   operator bool()                  whether it stands on an instance; of an association, whether the walk
+ *                                    goes on
  *   operator++()                     moves to the next
  *   getObjectPath()                  CMPIObjectPath* of the current instance
  *   getCMPIInstance(properties)      CMPIInstance* of the current instance
  * Some have:
- *   a constructor from (broker, context, namespace text), standing on no selection
+ *   a constructor from (broker, context, namespace text), for all instances, without selection
  *   createCMPIInstance(path)         CMPIInstance* of a new record with the path's key
  *   modifyCMPIInstance(instance, properties)   writes the instance's modifiable properties
  *   deleteCMPIInstance()             removes the current instance

@@ -11,7 +11,7 @@
 #include <utility>
 
 /**
- * Tracing of the provider's functions.
+ * Tracing of the provider's functions. It throws nothing: a line that cannot be written is lost.
  *
  * A source unit binds its logger and file name once, in a TraceUnit named `unit`. A function then
  * traces its entry and its exit with one line at its head:
@@ -113,8 +113,8 @@ void traceLine(const CallSite& site, MessageType type, const Parts&... parts) no
 
 /**
  * Traces a function's entry when made and its exit when the function is left normally; a function
- * left by an exception has no exit line. The parts are labels and values; a variable is shown at
- * exit with the value that it has then.
+ * left by an exception has no exit line. Both carry the line at which it is made. The parts are labels
+ * and values; a variable is shown at exit with the value that it has then.
  */
 template <class... Parts>
 class Traced {
@@ -200,7 +200,7 @@ constexpr const char* broker = " _broker=";
 constexpr const char* context = " _context=";
 }  // namespace label
 
-/** The rule between which every request stands in the log. */
+/** The rule. Every request stands between two of them in the log. */
 constexpr const char* requestRule = "==============================================================================";
 
 /** Where the marker lines of a request are filed: the framework's trace header, at lines of its own. */

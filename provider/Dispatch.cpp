@@ -26,8 +26,8 @@ using namespace Bodies;
 constexpr Body none = &invalidClass;
 
 /**
- * Class id, then the bodies in the order of Operation. An association class is enumerated but, as
- * designed, cannot be got.
+ * Class id, then the bodies in the order of Operation. Instances of an association class are enumerated
+ * but, on purpose, cannot be got.
  */
 constexpr std::array<DispatchRow, 6> dispatchTable{{
     // clang-format off

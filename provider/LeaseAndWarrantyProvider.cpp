@@ -66,9 +66,10 @@ std::string nameSpaceOf(const CMPIObjectPath* ref, CMPIStatus& status) {
 
 /**
  * Runs an operation's body for the class of a path or of a name, between the marks of the entry point.
- * What is thrown is only logged: the object manager sees a success with whatever was returned before.
- * Exceptions of other kinds than std::exception leave the provider. Only the status's code is
- * answered: a message that a failing call of the broker put beside it is not the provider's.
+ * What is thrown is only logged: the object manager sees the status as it stood, normally success, with
+ * whatever was returned before. Exceptions of other kinds than std::exception leave the provider. Only
+ * the status's code is answered: a message that a failing call of the broker put beside it is not the
+ * provider's.
  */
 template <class Class>
 CMPIStatus serve(const CallSite& site, Operation operation, Class requestedClass, Request& request) {

@@ -70,12 +70,16 @@ class RecordBase {
 public:
     using Property = typename Policy::Property;
 
-    /** Stands on the first record in use; at the end when the count is 0. Throws when it is not and there is none. */
+    /**
+     * Stands on the first record in use; at the end when the count is 0. Throws InstrumentationException
+     * when the count tells of records and none is in use.
+     */
     RecordBase();
 
     /**
-     * Rewrites the record file if this cursor changed anything; that may throw. While another
-     * exception is leaving, a failure is only logged: the process belongs to the object manager.
+     * Rewrites the record file if this cursor changed anything; that may throw InstrumentationException.
+     * While another exception is leaving, a failure is only logged: the process belongs to the object
+     * manager.
      */
     ~RecordBase() noexcept(false);
     RecordBase(const RecordBase&) = delete;
@@ -98,13 +102,14 @@ public:
      */
     bool create(const std::string& instanceId);
 
-    /** Deletes the current record; the cursor stays. Throws InstrumentationException when there is none. */
+    /** Deletes the current record; the cursor stays. Throws InstrumentationException when it is at the end. */
     void remove();
 
     /** @name Typed property access
      * Copies a property of the current record out, or changes it. The getters answer true.
-     * Throws InstrumentationException when no record is current, when the property is of another
-     * type, and on setting the identifier. A failure changes nothing.
+     * Throws InstrumentationException when the cursor is at the end, when the property is of another
+     * type, and on setting the identifier. A failure changes nothing. Whether the record has been deleted
+     * meanwhile is not looked at.
      */
     ///@{
     bool getProperty(Property property, std::string& value) const;
@@ -133,7 +138,7 @@ private:
 
     bool cacheModified = false;
     std::size_t cursor = end;
-    int exceptionsBefore = std::uncaught_exceptions();  ///< on their way when this cursor was made
+    int exceptionsBefore = std::uncaught_exceptions();  ///< how many were leaving when this cursor was made
 };
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -13,8 +13,8 @@ namespace KO::LeaseWarrantyProvider {
  */
 ///@{
 bool extract(std::istream& stream, unsigned int& number);  ///< decimal; a sign makes it no unsigned number
-bool extract(std::istream& stream, bool& flag);            ///< 0 or 1
-bool extract(std::istream& stream, std::string& word);
+bool extract(std::istream& stream, bool& flag);            ///< the number 0 or 1, also as in "01" or "+1"
+bool extract(std::istream& stream, std::string& word);     ///< up to the next white space
 ///@}
 
 /** What a line of a record file holds for a text. */
@@ -26,8 +26,7 @@ std::string unescaped(const std::string& line, TextForm form);
 /** Ends a line and hands it to the operating system: a record file is flushed line by line. */
 void endLine(std::ostream& stream);
 
-/** Reads a record's fields in the table's order, undoing the escapes of its texts. What cannot be read stays as it was.
- */
+/** Reads a record's fields in the table's order, undoing the escapes of texts. A missing field stays as it was. */
 template <class Unit, class Fields>
 void readRecord(std::istream& stream, Unit& unit, const Fields& fields) {
     for (const auto& field : fields) {

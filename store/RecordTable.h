@@ -13,7 +13,10 @@ namespace KO::LeaseWarrantyProvider {
 /** Room made for records before any is known. */
 constexpr std::size_t reservedRecords = 10;
 
-/** Whether this machine's memory could hold so many bytes at all. */
+/**
+ * Whether this machine's physical memory could hold so many objects of a size at all; true when that
+ * cannot be found out. What the process may use of it is not looked at.
+ */
 bool memoryCanHold(std::size_t count, std::size_t size);
 
 /** The path of a file of the agent's data directory. */
@@ -34,10 +37,11 @@ Stream openRecordFile(const std::string& path, std::ios::openmode mode) {
  * Reads a record file into an empty table.
  *
  * The count at the head is believed: a shorter file yields the declared number of records, a missing
- * field keeping the value of the record before. Only a count that memory cannot hold, or that is no
- * number, makes the file unreadable.
+ * field keeping the value of the record before. Only a count whose records the machine's memory cannot
+ * hold, or that is no number, makes the file unreadable.
  *
- * @param count receives the number of records; 0, with an empty table, for an unreadable file
+ * @param count receives the number of records; left as it was, like the table, for an unreadable file
+ * @throws std::bad_alloc when the process is refused the memory; the table may then hold some records
  */
 template <class Unit>
 void loadRecords(const std::string& path, unsigned int& count, std::vector<Unit>& table) {
@@ -68,7 +72,7 @@ void loadRecords(const std::string& path, unsigned int& count, std::vector<Unit>
 
 /**
  * Rewrites a record file in place: the count, then each record in use.
- * @return false when the file cannot be opened for writing
+ * @return false when the file cannot be opened for writing; a write that fails is not noticed
  */
 template <class Unit>
 bool writeRecords(const std::string& path, unsigned int count, const std::vector<Unit>& table) {

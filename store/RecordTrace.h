@@ -6,8 +6,8 @@ namespace KO::LeaseWarrantyProvider {
 
 /**
  * Traces the making and copying of records, as a base of each record type. It holds nothing; the
- * record types keep the copying that the compiler writes. Moves, as a growing table makes them, are
- * not traced.
+ * record types keep the copying that the compiler writes. Moves, as a growing table makes them, and
+ * destruction are not traced.
  *
  * Policy is that of the records' store.
  */
