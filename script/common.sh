@@ -86,3 +86,26 @@ shell_scripts() {
         (FNR == 1 && /^#!.*sh$/) || (FNR == 2 && /shellcheck shell=/) { printf "%s%c", FILENAME, 0 }
         FNR == 2 { nextfile }'
 }
+
+# test_programs PRESET [WRAPPER...]: runs the test programs of a built preset, each whole and under the
+# wrapper. Where starting a process is dear, a process a test, as in script/test, takes too long.
+test_programs() {
+    local preset=$1 directory=build/programs-$1
+    shift
+    mkdir -p "$directory"
+    ctest --preset "$preset" --show-only=json-v1 | python3 -c '
+import json, sys
+
+build, wrapper = sys.argv[1], sys.argv[2:]
+programs = {}
+for test in json.load(sys.stdin)["tests"]:
+    command = [word for word in test["command"] if not word.startswith("--gtest")]
+    if build in command[0]:
+        programs[tuple(command)] = command[0].rsplit("/", 1)[1]
+for number, (command, name) in enumerate(sorted(programs.items()), 1):
+    words = " ".join(f"[==[{word}]==]" for word in [*wrapper, *command])
+    print(f"add_test({name}.{number} {words})")
+    print(f"set_tests_properties({name}.{number} PROPERTIES TIMEOUT 900)")
+' "/build/$preset/" "$@" >"$directory/CTestTestfile.cmake"
+    ctest --test-dir "$directory" --parallel "$(nproc)" --output-on-failure --no-tests=error
+}
