@@ -3,6 +3,7 @@
 #include <systemd/sd-id128.h>
 
 #include <charconv>
+#include <initializer_list>
 
 namespace KO {
 
@@ -101,6 +102,17 @@ void readInstrumentation(Agent::TableReader table, AgentSettings& settings) {
     table.rejectUnknownKeys();
 }
 
+/** Switches of those who work beside the provider (KO::Settings): a table and its keys. */
+void readFlags(Agent::TableReader table, const std::string& name, std::initializer_list<const char*> keys,
+               AgentSettings& settings) {
+    for (const char* key : keys) {
+        if (const std::optional<bool> flag = table.flag(key)) {
+            settings.flags[name + '.' + key] = *flag;
+        }
+    }
+    table.rejectUnknownKeys();
+}
+
 }  // namespace
 
 AgentSettings readAgentSettings(const Agent::Document& document, Agent::Problems& problems) {
@@ -109,6 +121,7 @@ AgentSettings readAgentSettings(const Agent::Document& document, Agent::Problems
     readDirectories(root.table("directories"), settings);
     readProduct(root.table("product"), settings);
     readInstrumentation(root.table("instrumentation"), settings);
+    readFlags(root.table("gate"), "gate", {"refuse_lossy_values"}, settings);
     root.has("log");  // read by the logging library
     root.rejectUnknownKeys();
     return settings;

@@ -23,6 +23,8 @@ struct AgentSettings {
     std::string dmiRoot;      ///< directory of the kernel's DMI files
     bool discover;            ///< whether the computer is discovered
     std::vector<Node> nodes;  ///< nodes to be added, or put in the place of discovered ones
+
+    std::map<std::string, bool> flags;  ///< the switches that are set, by table and key: "gate.refuse_lossy_values"
 };
 
 /** Reads the settings; every value that is absent or wrong has its default. */

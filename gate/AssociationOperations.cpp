@@ -1,0 +1,218 @@
+#include "AssociationOperations.h"
+
+#include "Calls.h"
+#include "Links.h"
+#include "Objects.h"
+#include "PropertyList.h"
+#include "Values.h"
+
+#include <algorithm>
+
+namespace gate {
+
+namespace {
+
+bool isAny(const char* name) {
+    return name == nullptr || *name == '\0';
+}
+
+bool isOrAny(const char* asked, const char* name) {
+    return isAny(asked) || sameName(asked, name);
+}
+
+/** Whether a path's class is the class or, as the object manager knows, a subclass of it. */
+bool isA(const CMPIBroker* broker, const CMPIObjectPath* path, const char* className) {
+    if (sameName(classNameOf(path), className)) {
+        return true;
+    }
+    if (broker->eft == nullptr || broker->eft->classPathIsA == nullptr) {
+        return false;
+    }
+    CMPIStatus status{CMPI_RC_OK, nullptr};
+    const bool answer = broker->eft->classPathIsA(broker, path, className, &status) != 0;
+    return answer && status.rc == CMPI_RC_OK;
+}
+
+bool isComputerEnd(const Property& end) {
+    return sameName(end.referenceClass, computerClass);
+}
+
+/** A way along an association: from one of its two ends to the other. */
+struct Way {
+    const Class* association;
+    const Property* near;
+    const Property* far;
+
+    const CMPIObjectPath* nearOf(const Link& link) const {
+        return isComputerEnd(*near) ? link.computerPath : link.element;
+    }
+    const CMPIObjectPath* farOf(const Link& link) const {
+        return isComputerEnd(*near) ? link.element : link.computerPath;
+    }
+};
+
+/** The ways that begin at the request's path and that the filter allows. */
+std::vector<Way> waysFrom(const Request& request, const AssociationFilter& filter) {
+    std::vector<Way> ways;
+    for (const Class& association : Classes()) {
+        if (!association.isAssociation || !isOrAny(filter.associationClass, association.name)) {
+            continue;
+        }
+        const Property* one = association.begin();
+        const Property* other = one + 1;
+        for (const Way& way : {Way{&association, one, other}, Way{&association, other, one}}) {
+            if (isOrAny(filter.role, way.near->name) && isOrAny(filter.resultRole, way.far->name) &&
+                isA(request.broker, request.path, way.near->referenceClass)) {
+                ways.push_back(way);
+            }
+        }
+    }
+    return ways;
+}
+
+/** The links that a way leads along from a path. */
+std::vector<Link> linksAlong(const Way& way, const Provider& provider, const std::vector<Computer>& computers,
+                             const CMPIObjectPath* source) {
+    std::vector<Link> links = linksOf(provider, computers, *way.association);
+    const auto isElsewhere = [&](const Link& link) { return !samePath(way.nearOf(link), source); };
+    links.erase(std::remove_if(links.begin(), links.end(), isElsewhere), links.end());
+    return links;
+}
+
+void requireInstancePath(const CMPIObjectPath* path) {
+    if (ask<&CMPIObjectPathFT::getKeyCount>(path).value == 0) {
+        fail(CMPI_RC_ERR_INVALID_PARAMETER, "Associations begin at an instance: the path needs its keys.");
+    }
+}
+
+/** Calls `take(way, link, provider)` for each link at the path that the filter allows, in one turn. */
+template <class Take>
+void follow(const Request& request, const AssociationFilter& filter, Take take) {
+    requireInstancePath(request.path);
+    const std::vector<Way> ways = waysFrom(request, filter);
+    if (ways.empty()) {
+        return;
+    }
+    const std::vector<Computer> computers = knownComputers(request);
+    const Provider provider(request.context);
+    for (const Way& way : ways) {
+        for (const Link& link : linksAlong(way, provider, computers, request.path)) {
+            take(way, link, provider);
+        }
+    }
+}
+
+template <class Answer>
+void giveAll(const Request& request, const std::vector<Answer>& answers) {
+    for (const Answer& answer : answers) {
+        request.give(answer);
+    }
+    request.finish();
+}
+
+/** Drops the answers at a far end that is not of the result class. */
+template <class Answer, class PathOf>
+void restrict(const Request& request, const char* resultClass, std::vector<Answer>& answers, PathOf pathOfAnswer) {
+    const auto isOther = [&](const Answer& answer) {
+        return !isAny(resultClass) && !isA(request.broker, pathOfAnswer(answer), resultClass);
+    };
+    answers.erase(std::remove_if(answers.begin(), answers.end(), isOther), answers.end());
+}
+
+const CMPIObjectPath* associationPath(const Request& request, const Class& association, const Link& link) {
+    CMPIObjectPath* path = makePath(request.broker, nameSpaceOf(request.path), association.name);
+    for (const Property& end : association) {
+        addReference(path, end.name, isComputerEnd(end) ? link.computerPath : link.element);
+    }
+    return path;
+}
+
+/** Both ends of an association are its keys: no property list takes anything away. */
+const CMPIInstance* associationInstance(const Request& request, const Class& association, const Link& link) {
+    CMPIInstance* instance = makeInstance(request.broker, associationPath(request, association, link));
+    for (const Property& end : association) {
+        setReference(instance, end.name, isComputerEnd(end) ? link.computerPath : link.element);
+    }
+    return instance;
+}
+
+std::vector<Link> allLinks(const Request& request, const Class& association) {
+    const std::vector<Computer> computers = knownComputers(request);
+    return linksOf(Provider(request.context), computers, association);
+}
+
+/** The associations at the path, each made by a function of its class and link. */
+template <class Made>
+std::vector<const Made*> referencesBy(const Request& request, const AssociationFilter& filter,
+                                      const Made* (*made)(const Request&, const Class&, const Link&)) {
+    std::vector<const Made*> answers;
+    const AssociationFilter byAssociation{filter.resultClass, nullptr, filter.role, nullptr};
+    follow(request, byAssociation, [&](const Way& way, const Link& link, const Provider&) {
+        answers.push_back(made(request, *way.association, link));
+    });
+    return answers;
+}
+
+}  // namespace
+
+void associatorNames(const Request& request, const AssociationFilter& filter) {
+    std::vector<const CMPIObjectPath*> answers;
+    follow(request, filter,
+           [&](const Way& way, const Link& link, const Provider&) { answers.push_back(way.farOf(link)); });
+    restrict(request, filter.resultClass, answers, [](const CMPIObjectPath* path) { return path; });
+    giveAll(request, answers);
+}
+
+void associators(const Request& request, const AssociationFilter& filter, const char** properties) {
+    std::vector<const CMPIInstance*> answers;
+    const PropertyList list(properties);
+    follow(request, filter, [&](const Way& way, const Link& link, const Provider& provider) {
+        const CMPIInstance* instance = isComputerEnd(*way.far) ? link.computer : provider.get(link.element);
+        const Class* farClass = findClass(way.far->referenceClass);
+        if (instance != nullptr) {
+            answers.push_back(list.applied(request.broker, instance, *farClass));
+        }
+    });
+    restrict(request, filter.resultClass, answers, pathOf);
+    giveAll(request, answers);
+}
+
+void references(const Request& request, const AssociationFilter& filter, const char**) {
+    giveAll(request, referencesBy(request, filter, associationInstance));
+}
+
+void referenceNames(const Request& request, const AssociationFilter& filter) {
+    giveAll(request, referencesBy(request, filter, associationPath));
+}
+
+void enumerateAssociations(const Request& request, const Class& association) {
+    for (const Link& link : allLinks(request, association)) {
+        request.give(associationInstance(request, association, link));
+    }
+    request.finish();
+}
+
+void enumerateAssociationNames(const Request& request, const Class& association) {
+    for (const Link& link : allLinks(request, association)) {
+        request.give(associationPath(request, association, link));
+    }
+    request.finish();
+}
+
+void getAssociation(const Request& request, const Class& association) {
+    for (const Property& end : association) {
+        if (referenceOf(request.path, end.name) == nullptr) {
+            fail(CMPI_RC_ERR_INVALID_PARAMETER,
+                 std::string("The path of a ") + association.name + " needs the key " + end.name + " as a reference.");
+        }
+    }
+    for (const Link& link : allLinks(request, association)) {
+        if (samePath(associationPath(request, association, link), request.path)) {
+            request.give(associationInstance(request, association, link));
+            return request.finish();
+        }
+    }
+    fail(CMPI_RC_ERR_NOT_FOUND, std::string("There is no such ") + association.name + ".");
+}
+
+}  // namespace gate

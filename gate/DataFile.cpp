@@ -1,0 +1,139 @@
+#include "DataFile.h"
+
+#include "Failure.h"
+#include "KO/PlatformUtilities.h"
+
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <cerrno>
+#include <charconv>
+#include <fstream>
+#include <iterator>
+#include <system_error>
+#include <vector>
+
+namespace gate {
+
+namespace {
+
+constexpr DataFile dataFiles[] = {
+    {"VELKO_Lease", "Lease.dat", 13},
+    {"VELKO_Warranty", "Warranty.dat", 4},
+    {"VELKO_AssetIDDetails", "asset.dat", 0},
+};
+
+std::string pathOf(const DataFile& file) {
+    return std::string(KO::PlatformUtilities::getKelsaDataDir()) + file.fileName;
+}
+
+[[noreturn]] void failFor(const std::string& path, const std::string& reason) {
+    fail(CMPI_RC_ERR_FAILED, "The change cannot be stored in " + path + ": " + reason + ".");
+}
+
+std::string reasonOf(int error) {
+    return std::generic_category().message(error);
+}
+
+class Descriptor {
+public:
+    explicit Descriptor(const std::string& path) : number(open(path.c_str(), O_RDWR | O_CLOEXEC | O_NONBLOCK)) {}
+    ~Descriptor() {
+        if (isOpen()) {
+            close(number);
+        }
+    }
+    Descriptor(const Descriptor&) = delete;
+    Descriptor& operator=(const Descriptor&) = delete;
+
+    bool isOpen() const { return number >= 0; }
+
+    bool isRegular() const {
+        struct stat status {};
+        return fstat(number, &status) == 0 && S_ISREG(status.st_mode);
+    }
+
+private:
+    int number;
+};
+
+/** The lines of a text each of which is ended; the rest, if there is one, makes a line that is empty. */
+std::vector<std::string> linesOf(const std::string& text) {
+    std::vector<std::string> lines;
+    for (std::size_t begin = 0; begin < text.size();) {
+        const std::size_t end = text.find('\n', begin);
+        lines.push_back(end == std::string::npos ? std::string() : text.substr(begin, end - begin));
+        begin = end == std::string::npos ? text.size() : end + 1;
+    }
+    return lines;
+}
+
+/** The number of records that the file's head tells. */
+std::size_t declaredIn(const std::vector<std::string>& lines) {
+    std::size_t number = 0;
+    if (!lines.empty()) {
+        const std::string& head = lines.front();
+        std::from_chars(head.data(), head.data() + head.size(), number);
+    }
+    return number;
+}
+
+}  // namespace
+
+void DataFile::requireWritable() const {
+    const std::string path = pathOf(*this);
+    const std::string directory = KO::PlatformUtilities::getKelsaDataDir();
+    const Descriptor descriptor(path);
+    if (!descriptor.isOpen() && errno != ENOENT) {
+        failFor(path, reasonOf(errno));
+    }
+    if (descriptor.isOpen() && !descriptor.isRegular()) {
+        failFor(path, "it is no regular file");
+    }
+    // A property file is replaced by a new one, so the directory counts even where the file is there.
+    const bool needsDirectory = !descriptor.isOpen() || !keepsRecords();
+    if (needsDirectory && access(directory.c_str(), W_OK | X_OK) != 0) {
+        failFor(path, "the data directory " + directory + ": " + reasonOf(errno));
+    }
+}
+
+std::size_t DataFile::recordsOf(const std::string& identifier) const {
+    if (!keepsRecords()) {
+        return 0;
+    }
+    const std::string path = pathOf(*this);
+    std::ifstream stream(path, std::ios::binary);
+    const std::vector<std::string> lines =
+        linesOf({std::istreambuf_iterator<char>(stream), std::istreambuf_iterator<char>()});
+    const std::size_t whole = 1 + declaredIn(lines) * linesPerRecord;
+    if (lines.empty() || lines.size() < whole || (whole > 1 && lines.back().empty())) {
+        failFor(path, "it does not hold all records; the disk may be full");
+    }
+    std::string stored = identifier;
+    std::replace(stored.begin(), stored.end(), ' ', '_');
+    std::size_t found = 0;
+    // Values with line breaks, stored while such were not refused, leave no telling where a record begins.
+    const std::size_t step = lines.size() == whole ? linesPerRecord : 1;
+    for (std::size_t line = 1; line < lines.size(); line += step) {
+        found += lines[line] == stored ? 1U : 0U;
+    }
+    return found;
+}
+
+std::size_t DataFile::recordsBefore(const std::string& identifier) const {
+    try {
+        return recordsOf(identifier);
+    } catch (const Failure&) {
+        return 0;
+    }
+}
+
+const DataFile* dataFileOf(const Class& kept) {
+    const auto found = std::find_if(std::begin(dataFiles), std::end(dataFiles),
+                                    [&](const DataFile& file) { return sameName(file.className, kept.name); });
+    return found == std::end(dataFiles) ? nullptr : found;
+}
+
+}  // namespace gate

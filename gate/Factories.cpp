@@ -1,0 +1,217 @@
+#include "AssociationOperations.h"
+#include "Calls.h"
+#include "InstanceOperations.h"
+#include "Provider.h"
+
+#include <cxxabi.h>
+
+#include <atomic>
+#include <exception>
+
+namespace gate {
+
+namespace {
+
+/** The broker of the latest factory call. */
+std::atomic<const CMPIBroker*> manager{nullptr};
+
+/**
+ * Goes before the provider's own static objects, which were there first: from then on no request is let in, and none
+ * is inside.
+ */
+const struct GateKeeper {
+    ~GateKeeper() { theGate.close(); }
+} gateKeeper;
+
+/** A status with its reason. */
+CMPIStatus statusOf(CMPIrc rc, const std::string& text) noexcept {
+    try {
+        return {rc, make<&CMPIBrokerEncFT::newString>(manager.load(), text.c_str())};
+    } catch (...) {
+        return {rc, nullptr};
+    }
+}
+
+/** Runs what may fail; a status is all that leaves. */
+template <class Work>
+CMPIStatus guarded(Work work) {
+    try {
+        work();
+        return {CMPI_RC_OK, nullptr};
+    } catch (const abi::__forced_unwind&) {
+        throw;  // the thread is being ended: no exception, and not to be stopped
+    } catch (const Failure& failure) {
+        return statusOf(failure.rc, failure.text);
+    } catch (const std::exception& exception) {
+        return statusOf(CMPI_RC_ERR_FAILED, std::string("The request broke off: ") + exception.what());
+    } catch (...) {
+        return statusOf(CMPI_RC_ERR_FAILED, "The request broke off by an exception of an unknown kind.");
+    }
+}
+
+/** A request's stay in the library. */
+class Visit {
+public:
+    Visit() {
+        if (!theGate.arrive()) {
+            fail(CMPI_RC_ERR_FAILED, "The provider is shutting down. Ask again when the object manager has restarted.");
+        }
+    }
+    ~Visit() { theGate.depart(); }
+    Visit(const Visit&) = delete;
+    Visit& operator=(const Visit&) = delete;
+};
+
+template <class Operation>
+CMPIStatus serve(const CMPIContext* context, const CMPIResult* result, const CMPIObjectPath* path,
+                 Operation operation) {
+    return guarded([&] {
+        const Visit visit;
+        operation(Request{manager.load(), context, result, path});
+    });
+}
+
+/**
+ * Idle, the library asks to stay: the provider's tables would be read again from files that keep less than memory.
+ * When the object manager ends, the provider is told.
+ */
+CMPIStatus cleanUp(const CMPIContext* context, CMPIBoolean terminating) {
+    if (terminating == 0) {
+        return statusOf(CMPI_RC_DO_NOT_UNLOAD, "The provider keeps its tables in memory.");
+    }
+    return guarded([&] {
+        const Visit visit;
+        Provider(context).cleanUp();
+    });
+}
+
+CMPIStatus instanceCleanup(CMPIInstanceMI*, const CMPIContext* context, CMPIBoolean terminating) {
+    return cleanUp(context, terminating);
+}
+
+CMPIStatus enumInstanceNames(CMPIInstanceMI*, const CMPIContext* context, const CMPIResult* result,
+                             const CMPIObjectPath* path) {
+    return serve(context, result, path, enumerateInstanceNames);
+}
+
+CMPIStatus enumInstances(CMPIInstanceMI*, const CMPIContext* context, const CMPIResult* result,
+                         const CMPIObjectPath* path, const char** properties) {
+    return serve(context, result, path, [&](const Request& request) { enumerateInstances(request, properties); });
+}
+
+CMPIStatus get(CMPIInstanceMI*, const CMPIContext* context, const CMPIResult* result, const CMPIObjectPath* path,
+               const char** properties) {
+    return serve(context, result, path, [&](const Request& request) { getInstance(request, properties); });
+}
+
+CMPIStatus create(CMPIInstanceMI*, const CMPIContext* context, const CMPIResult* result, const CMPIObjectPath* path,
+                  const CMPIInstance* instance) {
+    return serve(context, result, path, [&](const Request& request) { createInstance(request, instance); });
+}
+
+CMPIStatus modify(CMPIInstanceMI*, const CMPIContext* context, const CMPIResult* result, const CMPIObjectPath* path,
+                  const CMPIInstance* instance, const char** properties) {
+    return serve(context, result, path, [&](const Request& request) { modifyInstance(request, instance, properties); });
+}
+
+CMPIStatus remove(CMPIInstanceMI*, const CMPIContext* context, const CMPIResult* result, const CMPIObjectPath* path) {
+    return serve(context, result, path, deleteInstance);
+}
+
+CMPIStatus execQuery(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*, const char*,
+                     const char*) {
+    return statusOf(CMPI_RC_ERR_NOT_SUPPORTED, "This provider answers no queries. Enumerate the class instead.");
+}
+
+CMPIStatus associationCleanup(CMPIAssociationMI*, const CMPIContext* context, CMPIBoolean terminating) {
+    return cleanUp(context, terminating);
+}
+
+CMPIStatus associate(CMPIAssociationMI*, const CMPIContext* context, const CMPIResult* result,
+                     const CMPIObjectPath* path, const char* associationClass, const char* resultClass,
+                     const char* role, const char* resultRole, const char** properties) {
+    return serve(context, result, path, [&](const Request& request) {
+        associators(request, {associationClass, resultClass, role, resultRole}, properties);
+    });
+}
+
+CMPIStatus associateNames(CMPIAssociationMI*, const CMPIContext* context, const CMPIResult* result,
+                          const CMPIObjectPath* path, const char* associationClass, const char* resultClass,
+                          const char* role, const char* resultRole) {
+    return serve(context, result, path, [&](const Request& request) {
+        associatorNames(request, {associationClass, resultClass, role, resultRole});
+    });
+}
+
+CMPIStatus refer(CMPIAssociationMI*, const CMPIContext* context, const CMPIResult* result, const CMPIObjectPath* path,
+                 const char* resultClass, const char* role, const char** properties) {
+    return serve(context, result, path, [&](const Request& request) {
+        references(request, {nullptr, resultClass, role, nullptr}, properties);
+    });
+}
+
+CMPIStatus referNames(CMPIAssociationMI*, const CMPIContext* context, const CMPIResult* result,
+                      const CMPIObjectPath* path, const char* resultClass, const char* role) {
+    return serve(context, result, path, [&](const Request& request) {
+        referenceNames(request, {nullptr, resultClass, role, nullptr});
+    });
+}
+
+CMPIInstanceMIFT instanceFunctions{
+    CMPIVersion200,
+    CMPIVersion200,
+    "instanceLeaseAndWarrantyGate",
+    instanceCleanup,
+    enumInstanceNames,
+    enumInstances,
+    get,
+    create,
+    modify,
+    remove,
+    execQuery,
+};
+
+CMPIAssociationMIFT associationFunctions{
+    CMPIVersion200, CMPIVersion200, "associationLeaseAndWarrantyGate", associationCleanup, associate, associateNames,
+    refer,          referNames,
+};
+
+CMPIInstanceMI instanceInterface{nullptr, &instanceFunctions};
+CMPIAssociationMI associationInterface{nullptr, &associationFunctions};
+
+/** Answers an interface once the provider is connected; null, with the reason in the status, otherwise. */
+template <class Interface>
+Interface* open(const CMPIBroker* broker, CMPIStatus* rc, Interface& interface) {
+    const CMPIStatus status = guarded([&] {
+        if (broker == nullptr) {
+            fail(CMPI_RC_ERR_INVALID_PARAMETER, "There is no broker.");
+        }
+        manager = broker;
+        const Visit visit;
+        if (!Provider::connect(broker)) {
+            fail(CMPI_RC_ERR_FAILED, "The provider behind the gate does not give its interfaces.");
+        }
+    });
+    if (rc != nullptr) {
+        *rc = status;
+    }
+    return status.rc == CMPI_RC_OK ? &interface : nullptr;
+}
+
+}  // namespace
+
+}  // namespace gate
+
+extern "C" {
+
+__attribute__((visibility("default"))) CMPIInstanceMI* LeaseAndWarrantyGate_Create_InstanceMI(const CMPIBroker* broker,
+                                                                                              const CMPIContext*,
+                                                                                              CMPIStatus* rc) {
+    return gate::open(broker, rc, gate::instanceInterface);
+}
+
+__attribute__((visibility("default"))) CMPIAssociationMI* LeaseAndWarrantyGate_Create_AssociationMI(
+    const CMPIBroker* broker, const CMPIContext*, CMPIStatus* rc) {
+    return gate::open(broker, rc, gate::associationInterface);
+}
+}

@@ -1,0 +1,20 @@
+#pragma once
+
+#include <cmpidt.h>
+
+#include <string>
+#include <utility>
+
+namespace gate {
+
+/** Ends a request with a status; the text is for a person who can do something about it. */
+struct Failure {
+    CMPIrc rc;
+    std::string text;
+};
+
+[[noreturn]] inline void fail(CMPIrc rc, std::string text) {
+    throw Failure{rc, std::move(text)};
+}
+
+}  // namespace gate

@@ -1,0 +1,72 @@
+#include "Links.h"
+
+#include "Calls.h"
+#include "Objects.h"
+#include "Values.h"
+
+#include <algorithm>
+
+namespace gate {
+
+namespace {
+
+CMPIEnumeration* enumerateComputers(const Request& request) {
+    const CMPIBroker& broker = *request.broker;
+    require(broker.bft != nullptr && broker.bft->enumerateInstances != nullptr, "enumerate computers");
+    const CMPIObjectPath* classPath = makePath(request.broker, nameSpaceOf(request.path), computerClass);
+    CMPIStatus status{CMPI_RC_OK, nullptr};
+    CMPIEnumeration* computers =
+        broker.bft->enumerateInstances(request.broker, request.context, classPath, nullptr, &status);
+    require(status.rc == CMPI_RC_OK, "enumerate computers", status);
+    return computers;
+}
+
+/** The instance's path, made anew: some managers leave the namespace out. */
+const CMPIObjectPath* computerPathOf(const Request& request, const CMPIInstance* instance) {
+    const CMPIObjectPath* given = pathOf(instance);
+    const Property name = *findProperty(*findClass(computerClass), "Name");
+    const auto key = keyOf(given, name);
+    require(key.has_value(), "name a computer");
+    CMPIObjectPath* path = makePath(request.broker, nameSpaceOf(request.path), classNameOf(given).c_str());
+    const CMPICount count = ask<&CMPIObjectPathFT::getKeyCount>(given).value;
+    for (CMPICount index = 0; index < count; ++index) {
+        CMPIString* keyName = nullptr;
+        const auto data = ask<&CMPIObjectPathFT::getKeyAt>(given, index, &keyName);
+        const CMPIStatus status =
+            tell<&CMPIObjectPathFT::addKey>(path, textOf(keyName).c_str(), &data.value.value, data.value.type);
+        require(data.isOk() && status.rc == CMPI_RC_OK, "name a computer", status);
+    }
+    return path;
+}
+
+}  // namespace
+
+std::vector<Computer> knownComputers(const Request& request) {
+    std::vector<Computer> computers;
+    CMPIEnumeration* enumeration = enumerateComputers(request);
+    while (ask<&CMPIEnumerationFT::hasNext>(enumeration).value != 0) {
+        const auto next = ask<&CMPIEnumerationFT::getNext>(enumeration);
+        const bool isInstance = next.isOk() && next.value.type == CMPI_instance &&
+                                (next.value.state & CMPI_nullValue) == 0 && next.value.value.inst != nullptr;
+        require(isInstance, "enumerate computers", next.status);
+        const CMPIObjectPath* path = computerPathOf(request, next.value.value.inst);
+        const bool isKnown = std::any_of(computers.begin(), computers.end(),
+                                         [&](const Computer& each) { return samePath(each.path, path); });
+        if (!isKnown) {
+            computers.push_back({path, next.value.value.inst});
+        }
+    }
+    return computers;
+}
+
+std::vector<Link> linksOf(const Provider& provider, const std::vector<Computer>& computers, const Class& association) {
+    std::vector<Link> links;
+    for (const Computer& computer : computers) {
+        for (const CMPIObjectPath* element : provider.associatorNames(computer.path, association.name)) {
+            links.push_back({computer.path, computer.instance, element});
+        }
+    }
+    return links;
+}
+
+}  // namespace gate

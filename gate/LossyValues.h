@@ -1,0 +1,18 @@
+#pragma once
+
+#include "DataFile.h"
+#include "Values.h"
+
+namespace gate {
+
+/**
+ * Refuses a value that would not be the same after the object manager is restarted: the data files have their limits
+ * (docs/data-files.md), and object managers take blanks off the ends of values. CMPI_RC_ERR_INVALID_PARAMETER with the
+ * property and the reason. Refuses nothing where the agent's configuration says refuse_lossy_values = false.
+ */
+void requireKept(const DataFile& file, const Property& property, const std::string& text);
+
+/** The same for every one of the values that can be written. */
+void requireKept(const DataFile& file, const Values& values);
+
+}  // namespace gate

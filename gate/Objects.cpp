@@ -1,0 +1,89 @@
+#include "Objects.h"
+
+#include "Calls.h"
+#include "Values.h"
+
+namespace gate {
+
+namespace {
+
+/** Whether the second path has that key of the first one. */
+bool sameKey(const CMPIData& key, const char* name, const CMPIObjectPath* other) {
+    if (key.type == CMPI_ref) {
+        const CMPIObjectPath* target = referenceOf(other, name);
+        return target != nullptr && samePath(key.value.ref, target);
+    }
+    const CMPIType type = key.type == CMPI_chars ? CMPI_string : key.type;
+    const Property property{name, type, true, false, nullptr};
+    const auto text = valueOf(key, {CMPI_RC_OK, nullptr}, property);
+    return text && text == keyOf(other, property);
+}
+
+CMPICount keyCount(const CMPIObjectPath* path) {
+    return ask<&CMPIObjectPathFT::getKeyCount>(path).value;
+}
+
+}  // namespace
+
+std::string classNameOf(const CMPIObjectPath* path) {
+    return textOf(ask<&CMPIObjectPathFT::getClassName>(path).value);
+}
+
+std::string nameSpaceOf(const CMPIObjectPath* path) {
+    return textOf(ask<&CMPIObjectPathFT::getNameSpace>(path).value);
+}
+
+CMPIObjectPath* makePath(const CMPIBroker* broker, const std::string& nameSpace, const char* className) {
+    CMPIObjectPath* path = make<&CMPIBrokerEncFT::newObjectPath>(broker, nameSpace.c_str(), className);
+    require(path != nullptr, "make an object path");
+    return path;
+}
+
+CMPIInstance* makeInstance(const CMPIBroker* broker, const CMPIObjectPath* path) {
+    CMPIInstance* instance = make<&CMPIBrokerEncFT::newInstance>(broker, path);
+    require(instance != nullptr, "make an instance");
+    return instance;
+}
+
+CMPIObjectPath* namingPath(const CMPIBroker* broker, const CMPIObjectPath* path, const Class& named) {
+    CMPIObjectPath* made = makePath(broker, nameSpaceOf(path), named.name);
+    for (const Property& property : named) {
+        if (!property.isKey) {
+            continue;
+        }
+        const auto text = keyOf(path, property);
+        if (!text) {
+            fail(CMPI_RC_ERR_INVALID_PARAMETER,
+                 std::string("The path of a ") + named.name + " needs the key " + property.name + " as a string.");
+        }
+        addKey(made, property.name, *text);
+    }
+    return made;
+}
+
+const CMPIObjectPath* pathOf(const CMPIInstance* instance) {
+    const auto answer = ask<&CMPIInstanceFT::getObjectPath>(instance);
+    require(answer.isOk() && answer.value != nullptr, "give the path of an instance", answer.status);
+    return answer.value;
+}
+
+bool samePath(const CMPIObjectPath* left, const CMPIObjectPath* right) {
+    if (!sameName(classNameOf(left), classNameOf(right)) || keyCount(left) != keyCount(right)) {
+        return false;
+    }
+    const std::string leftSpace = nameSpaceOf(left);
+    const std::string rightSpace = nameSpaceOf(right);
+    if (!leftSpace.empty() && !rightSpace.empty() && !sameName(leftSpace, rightSpace)) {
+        return false;
+    }
+    for (CMPICount index = 0; index < keyCount(left); ++index) {
+        CMPIString* name = nullptr;
+        const auto key = ask<&CMPIObjectPathFT::getKeyAt>(left, index, &name);
+        if (!key.isOk() || !sameKey(key.value, textOf(name).c_str(), right)) {
+            return false;
+        }
+    }
+    return true;
+}
+
+}  // namespace gate

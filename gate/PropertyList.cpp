@@ -1,0 +1,75 @@
+#include "PropertyList.h"
+
+#include "Calls.h"
+#include "Objects.h"
+
+#include <algorithm>
+#include <string>
+#include <vector>
+
+namespace gate {
+
+namespace {
+
+/** The class's keys as a list that ends with null. */
+std::vector<const char*> keysOf(const Class& owner) {
+    std::vector<const char*> keys;
+    for (const Property& property : owner) {
+        if (property.isKey) {
+            keys.push_back(property.name);
+        }
+    }
+    keys.push_back(nullptr);
+    return keys;
+}
+
+}  // namespace
+
+bool PropertyList::has(const Property& property) const {
+    if (names == nullptr) {
+        return true;
+    }
+    for (const char** name = names; *name != nullptr; ++name) {
+        if (sameName(*name, property.name)) {
+            return true;
+        }
+    }
+    return false;
+}
+
+bool PropertyList::hasAll(const Class& owner) const {
+    return names == nullptr ||
+           std::all_of(owner.begin(), owner.end(), [&](const Property& property) { return has(property); });
+}
+
+void PropertyList::requireKnown(const Class& owner) const {
+    for (const char** name = names; name != nullptr && *name != nullptr; ++name) {
+        if (findProperty(owner, *name) == nullptr) {
+            fail(CMPI_RC_ERR_NO_SUCH_PROPERTY, std::string(owner.name) + " has no property " + *name + ".");
+        }
+    }
+}
+
+const CMPIInstance* PropertyList::applied(const CMPIBroker* broker, const CMPIInstance* instance,
+                                          const Class& owner) const {
+    if (hasAll(owner)) {
+        return instance;
+    }
+    CMPIInstance* made = makeInstance(broker, pathOf(instance));
+    // Some managers put all properties of a class into a new instance: this keeps out what nobody asked for.
+    std::vector<const char*> keys = keysOf(owner);
+    tell<&CMPIInstanceFT::setPropertyFilter>(made, names, keys.data());
+    for (const Property& property : owner) {
+        const auto answer = ask<&CMPIInstanceFT::getProperty>(instance, property.name);
+        const bool isThere = answer.isOk() && (answer.value.state & (CMPI_notFound | CMPI_badValue)) == 0;
+        if (isThere && (property.isKey || has(property))) {
+            const bool isNull = (answer.value.state & CMPI_nullValue) != 0;
+            const CMPIStatus status = tell<&CMPIInstanceFT::setProperty>(
+                made, property.name, isNull ? nullptr : &answer.value.value, answer.value.type);
+            require(status.rc == CMPI_RC_OK, "set a property", status);
+        }
+    }
+    return made;
+}
+
+}  // namespace gate

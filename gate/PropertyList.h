@@ -1,0 +1,29 @@
+#pragma once
+
+#include "Schema.h"
+
+#include <cmpift.h>
+
+namespace gate {
+
+/** The properties that a client asks for, or means; null for all. Names ignore letter case. */
+class PropertyList {
+public:
+    explicit PropertyList(const char** listed) : names(listed) {}
+
+    bool has(const Property& property) const;
+
+    /** Whether every property of the class is on it. */
+    bool hasAll(const Class& owner) const;
+
+    /** CMPI_RC_ERR_NO_SUCH_PROPERTY when it has a name that the class does not know. */
+    void requireKnown(const Class& owner) const;
+
+    /** The instance with its keys and what is on the list: itself, or a new one when something has to go. */
+    const CMPIInstance* applied(const CMPIBroker* broker, const CMPIInstance* instance, const Class& owner) const;
+
+private:
+    const char** names;
+};
+
+}  // namespace gate

@@ -1,0 +1,50 @@
+#pragma once
+
+#include "CapturedResult.h"
+#include "Gate.h"
+
+#include <cmpift.h>
+
+#include <string>
+#include <vector>
+
+namespace gate {
+
+/**
+ * The provider behind the gate, driven through its own factories and function tables. Who has this object has the
+ * turn: nobody else is inside the provider, except while the provider waits for the object manager.
+ *
+ * Paths name the instance completely. The provider logs what goes wrong inside it and answers a success; where that
+ * can be seen, because the answer was not ended, it is a failure here.
+ */
+class Provider {
+public:
+    using Paths = std::vector<const CMPIObjectPath*>;
+    using Instances = std::vector<const CMPIInstance*>;
+
+    /** Tells the provider of its broker; false when it does not give its interfaces. */
+    static bool connect(const CMPIBroker* manager);
+
+    explicit Provider(const CMPIContext* itsContext) : context(itsContext) {}
+
+    Paths names(const CMPIObjectPath* classPath) const;
+    Instances instances(const CMPIObjectPath* classPath) const;
+
+    /** Null when there is none. */
+    const CMPIInstance* get(const CMPIObjectPath* path) const;
+
+    void create(const CMPIObjectPath* path, const CMPIInstance* instance) const;
+    void modify(const CMPIObjectPath* path, const CMPIInstance* instance) const;
+    void remove(const CMPIObjectPath* path) const;
+
+    Paths associatorNames(const CMPIObjectPath* path, const char* associationClass) const;
+
+    /** Ends both interfaces, as the object manager does that ends itself. */
+    void cleanUp() const;
+
+private:
+    Turn turn;
+    const CMPIContext* context;
+};
+
+}  // namespace gate

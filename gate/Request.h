@@ -1,0 +1,30 @@
+#pragma once
+
+#include "Schema.h"
+
+#include <cmpift.h>
+
+namespace gate {
+
+/** The computers' class. Another provider serves it; this one's associations begin there. */
+constexpr const char* computerClass = "VELKO_ComputerSystem";
+
+/** One request: what the object manager passed, all of it borrowed. */
+struct Request {
+    const CMPIBroker* broker;  ///< the object manager's own
+    const CMPIContext* context;
+    const CMPIResult* result;
+    const CMPIObjectPath* path;
+
+    /** The path's class; CMPI_RC_ERR_INVALID_CLASS when it is none that the provider serves. */
+    const Class& requestedClass() const;
+
+    /** Hands an answer out; fails when the object manager does not take it. */
+    void give(const CMPIInstance* instance) const;
+    void give(const CMPIObjectPath* path) const;
+
+    /** Ends the answer. */
+    void finish() const;
+};
+
+}  // namespace gate
