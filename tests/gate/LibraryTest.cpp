@@ -1,0 +1,111 @@
+#include "GateFixture.h"
+
+#include <cstdio>
+#include <memory>
+
+// The built library as a file, its factories, its coming and going.
+
+namespace gatetest {
+namespace {
+
+using testing::ElementsAre;
+using testing::HasSubstr;
+using testing::IsEmpty;
+using testing::Not;
+
+/** What a command of the shell writes, errors included. */
+std::string outputOf(const std::string& command) {
+    const std::unique_ptr<FILE, int (*)(FILE*)> pipe(popen((command + " 2>&1").c_str(), "r"), &pclose);
+    std::string output;
+    for (int character = std::fgetc(pipe.get()); character != EOF; character = std::fgetc(pipe.get())) {
+        output += static_cast<char>(character);
+    }
+    return output;
+}
+
+using LibraryTest = GateTest;
+
+TEST_F(LibraryTest, ExportsExactlyTheTwoFactories) {
+    EXPECT_EQ(outputOf("nm --dynamic --defined-only --format=posix " GATE_LIBRARY " | cut -d' ' -f1,2 | sort"),
+              "LeaseAndWarrantyGate_Create_AssociationMI T\nLeaseAndWarrantyGate_Create_InstanceMI T\n");
+}
+
+TEST_F(LibraryTest, FindsTheProviderBesideItself) {
+    EXPECT_THAT(outputOf("readelf --dynamic " GATE_LIBRARY),
+                AllOf(HasSubstr("[libLeaseAndWarrantyProvider.so]"), HasSubstr("[$ORIGIN]")));
+}
+
+TEST_F(LibraryTest, LeavesNoSymbolOpen) {
+    const std::string relocations = outputOf("LD_PRELOAD= ldd -r " GATE_LIBRARY);
+    EXPECT_THAT(relocations, HasSubstr("libLeaseAndWarrantyProvider.so =>"));
+    // A build with sanitizers finds their functions in the program.
+    if (outputOf("nm --dynamic " GATE_LIBRARY).find("_san_") == std::string::npos) {
+        EXPECT_THAT(relocations, Not(HasSubstr("undefined symbol")));
+    }
+    EXPECT_THAT(relocations, Not(HasSubstr("not found")));
+}
+
+TEST_F(LibraryTest, AFactoryWithoutBrokerSaysSo) {
+    CMPIStatus status{CMPI_RC_OK, nullptr};
+    EXPECT_EQ(gate().createInstanceMI(nullptr, &status), nullptr);
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_INVALID_PARAMETER);
+    status.rc = CMPI_RC_OK;
+    EXPECT_EQ(gate().createAssociationMI(nullptr, &status), nullptr);
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_INVALID_PARAMETER);
+    EXPECT_EQ(gate().createInstanceMI(nullptr, nullptr), nullptr);
+    EXPECT_THAT(create("L1"), isAnswered(1)) << "a good factory call mends it";
+}
+
+TEST_F(LibraryTest, FactoriesMayBeCalledAgainAndAgain) {
+    CMPIStatus status{CMPI_RC_ERR_FAILED, nullptr};
+    CMPIInstanceMI* first = gate().createInstanceMI(broker.handle(), &status);
+    EXPECT_NE(first, nullptr);
+    EXPECT_EQ(status.rc, CMPI_RC_OK);
+    EXPECT_EQ(gate().createInstanceMI(broker.handle(), nullptr), first);
+    EXPECT_NE(gate().createAssociationMI(broker.handle(), &status), nullptr);
+    EXPECT_EQ(first->ft->ftVersion, CMPIVersion200);
+    EXPECT_EQ(first->ft->miVersion, CMPIVersion200);
+}
+
+TEST_F(LibraryTest, TheBrokerOfTheLatestFactoryCallServes) {
+    gate().createInstanceMI(broker.handle(), nullptr);
+    create("L1");
+    testsupport::RecordingBroker other;
+    gate().createInstanceMI(other.handle(), nullptr);
+    other.forget();
+    broker.forget();
+    EXPECT_THAT(identifiers(), ElementsAre("L1"));
+    EXPECT_GT(other.count("CMPIBrokerEncFT.newObjectPath"), 0);
+    EXPECT_EQ(broker.count("CMPIBrokerEncFT.newObjectPath"), 0);
+    unload();  // before the other broker goes
+}
+
+TEST_F(LibraryTest, StaysWhileIdleAndGoesWhenTheManagerEnds) {
+    create("L1");
+    EXPECT_THAT(gate().cleanupInstanceMI(false), isRefused(CMPI_RC_DO_NOT_UNLOAD, "memory"));
+    EXPECT_THAT(gate().cleanupAssociationMI(false), isRefused(CMPI_RC_DO_NOT_UNLOAD, "memory"));
+    EXPECT_THAT(identifiers(), ElementsAre("L1"));
+    EXPECT_THAT(gate().cleanupInstanceMI(true), isDone());
+    EXPECT_THAT(gate().cleanupAssociationMI(true), isDone());
+    EXPECT_THAT(identifiers(), ElementsAre("L1")) << "some managers go on after that";
+}
+
+TEST_F(LibraryTest, ComesAndGoesAgainAndAgain) {
+    for (int round = 0; round < 3; ++round) {
+        EXPECT_THAT(identifiers(), testing::SizeIs(round));
+        create("L" + std::to_string(round));
+        unload();
+    }
+}
+
+TEST_F(LibraryTest, CallsNothingOfTheBrokerWhenLoadedAndTellsItsFailuresInWords) {
+    gate();
+    EXPECT_THAT(broker.calls(), IsEmpty());
+    broker.answerNothingEver("CMPIBrokerEncFT.newString");
+    const Outcome outcome = gate().getInstance(keyedPath(lease, "L1"));
+    EXPECT_EQ(outcome.rc, CMPI_RC_ERR_NOT_FOUND) << "also when no words can be made";
+    EXPECT_FALSE(outcome.hasMessage);
+}
+
+}  // namespace
+}  // namespace gatetest
