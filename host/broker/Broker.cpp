@@ -30,7 +30,7 @@ UpCalls& noUpCalls() {
 
 BrokerOptions completed(BrokerOptions options) {
     if (options.tables == nullptr) {
-        options.tables = &standardTables();
+        options.tables = &tablesOf(options.manager);
     }
     if (options.upCalls == nullptr) {
         options.upCalls = &noUpCalls();
@@ -41,7 +41,8 @@ BrokerOptions completed(BrokerOptions options) {
 /** The standard's broker points to tables without const; nobody writes to them. */
 CMPIBroker handleOf(Broker& broker, const FunctionTables& tables) {
     auto& plain = const_cast<FunctionTables&>(tables);
-    return {&broker, &plain.broker, &plain.encapsulation, &plain.threads, &plain.memory};
+    const bool hasMemory = broker.profile().gaps != BrokerGaps::memoryTable;
+    return {&broker, &plain.broker, &plain.encapsulation, &plain.threads, hasMemory ? &plain.memory : nullptr};
 }
 
 }  // namespace

@@ -12,6 +12,7 @@
 #include "broker/ClassShape.h"
 #include "broker/FunctionTables.h"
 #include "broker/MemoryBlocks.h"
+#include "broker/Profile.h"
 #include "broker/UpCalls.h"
 
 namespace cimhost {
@@ -30,7 +31,8 @@ struct BrokerOptions {
     UpCalls* upCalls = nullptr;                   ///< not owned; null: no up-call is supported
     std::function<void(const LogRecord&)> log{};  ///< none: log and trace records are dropped; may be called on
                                                   ///< several threads at a time
-    const FunctionTables* tables = nullptr;       ///< not owned; null: standardTables()
+    const FunctionTables* tables = nullptr;       ///< not owned, gaps and all; null: those of the manager
+    Manager manager = Manager::standard;          ///< the object manager that it is the broker of
 };
 
 /**
@@ -55,6 +57,12 @@ public:
 
     const FunctionTables& tables() const { return *options.tables; }
     UpCalls& upCalls() const { return *options.upCalls; }
+
+    /** How its object manager treats providers. */
+    const Profile& profile() const { return profileOf(options.manager); }
+
+    /** Is the broker of that manager from now on, its tables apart. Not while requests run. */
+    void play(Manager manager) { options.manager = manager; }
 
     /** Shape of a class, or null when it is not known. */
     std::shared_ptr<const ClassShape> classShape(const std::string& className) const;

@@ -15,6 +15,7 @@ struct PropertyShape {
     CMPIType type = CMPI_null;  ///< element type, without CMPI_ARRAY
     bool isArray = false;
     bool isKey = false;
+    std::string referenceClass{};  ///< of a reference, the class that it refers to; empty otherwise
 };
 
 /** What the broker needs to know of a class: all its properties, inherited ones too, and what it descends from. */

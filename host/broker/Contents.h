@@ -51,9 +51,18 @@ struct ContextContent {
     std::vector<NamedValue> entries{};
 };
 
+/** What a result insists on. What it refuses is answered with an error and does not become an event. */
+struct ResultRules {
+    bool refusesInstances = false;
+    bool refusesToBeEmpty = false;  ///< returnDone before anything was returned
+    bool keepsPaths = false;        ///< paths that were returned must not be released by the provider
+};
+
 /** Content of a CMPIResult: where the events go. They belong to who runs the request. */
 struct ResultContent {
     ResultEvents* events = nullptr;
+    ResultRules rules{};
+    std::shared_ptr<bool> pathReleased{};  ///< true once such a path was released; null while none was returned
 };
 
 /** What the broker knows of a handle type: its content, its kind, its name and its table. */

@@ -95,6 +95,20 @@ CMPIData nullData(CMPIType type) {
     return data;
 }
 
+CMPIData hollowData(bool isNull, Arena& arena) {
+    CMPIData data = nullData(CMPI_string);
+    data.state = isNull ? CMPI_nullValue : CMPI_goodValue;
+    data.value.string = arena.make<CMPIString>({});
+    objectOf(data.value.string)->isHollow = true;
+    return data;
+}
+
+/** Whether the value, of a type with objects, has none that means something. */
+bool isEmptyHanded(const CMPIValue& value, CMPIType type) {
+    const auto* text = type == CMPI_string ? objectOf(value.string) : nullptr;
+    return value.string == nullptr || (text != nullptr && text->isHollow);
+}
+
 Value arrayFrom(const CMPIArray* array, CMPIType type) {
     Value result{type, true, array == nullptr, {}};
     if (array != nullptr) {
@@ -131,7 +145,7 @@ Scalar scalarFrom(const CMPIValue* value, CMPIType type) {
         return std::string(reinterpret_cast<const char*>(value));
     }
     if (isEncapsulated(type)) {
-        return value->string == nullptr ? Scalar{} : readEncapsulated(*value, type);
+        return isEmptyHanded(*value, type) ? Scalar{} : readEncapsulated(*value, type);
     }
     Scalar scalar;
     const bool found = anyPlainType([&](const auto& each) {
@@ -187,6 +201,9 @@ CMPIData dataFrom(const Value& value, Arena& arena) {
             data.value.array = arena.make<CMPIArray>({value.type, value.elements});
         }
         return data;
+    }
+    if (isHollow(value)) {
+        return hollowData(value.isNull, arena);
     }
     return value.isNull || value.elements.empty() ? nullData(value.type)
                                                   : dataFrom(value.elements.front(), value.type, arena);

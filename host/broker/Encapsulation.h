@@ -32,6 +32,7 @@ Handle* cloneObject(const Handle* handle, CMPIStatus* rc) {
         Encapsulated<Handle>& original = self(handle);
         Handle* copy = original.arena().clones().template make<Handle>(*original.content);
         objectOf(copy)->isClone = true;
+        objectOf(copy)->isHollow = original.isHollow;
         return copy;
     });
 }

@@ -6,7 +6,7 @@ namespace cimhost {
 
 /**
  * All function tables that a provider meets. Objects point into the set that their broker was made with, so it
- * must outlive the broker. Every slot is filled.
+ * must outlive the broker.
  */
 struct FunctionTables {
     CMPIBrokerFT broker;
@@ -25,7 +25,12 @@ struct FunctionTables {
     CMPIErrorFT error;
 };
 
-/** The tables of this host. They live as long as the program. */
+enum class Manager;
+
+/** The tables of this host, with every function. They live as long as the program. */
 const FunctionTables& standardTables();
+
+/** The same as they look under an object manager. They live as long as the program. */
+const FunctionTables& tablesOf(Manager manager);
 
 }  // namespace cimhost

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <memory>
 #include <optional>
 #include <utility>
 
@@ -13,7 +14,7 @@ class Arena;
 class Object {
 public:
     Object(Arena& itsOwner, ObjectKind itsKind) : owner(itsOwner), kindOf(itsKind) {}
-    virtual ~Object() = default;
+    virtual ~Object() { noticeRelease(); }
     Object(const Object&) = delete;
     Object& operator=(const Object&) = delete;
 
@@ -23,6 +24,19 @@ public:
 
     /** Clones live until somebody releases them: they outlive requests and marks. */
     bool isClone = false;
+
+    /** A string without characters, not even the empty ones, as some object managers have them. */
+    bool isHollow = false;
+
+    /** Becomes true when the object is released or goes; may be null. */
+    std::shared_ptr<bool> released{};
+
+protected:
+    void noticeRelease() {
+        if (released != nullptr) {
+            *released = true;
+        }
+    }
 
 private:
     Arena& owner;
@@ -48,6 +62,7 @@ public:
     void release() {
         handle.hdl = nullptr;
         content.reset();
+        noticeRelease();
     }
 
     Handle handle;

@@ -40,18 +40,28 @@ CMPIData asKey(CMPIData data) {
     return data;
 }
 
+/** A key without a value, as some object managers pass to providers, is counted; who asks for it is told so. */
+CMPIData toldIfNull(const CMPIData& data, CMPIStatus* rc) {
+    if (rc != nullptr && rc->rc == CMPI_RC_OK && (data.state & CMPI_nullValue) != 0) {
+        rc->rc = CMPI_RC_ERR_NOT_FOUND;
+    }
+    return data;
+}
+
 CMPIData getKey(const CMPIObjectPath* path, const char* name, CMPIStatus* rc) {
-    return guarded(rc, badData(), [&] {
+    const CMPIData data = guarded(rc, badData(), [&] {
         const auto& object = self(path);
         return asKey(namedData(object.content->keys, name, arenaFor(object)));
     });
+    return toldIfNull(data, rc);
 }
 
 CMPIData getKeyAt(const CMPIObjectPath* path, CMPICount index, CMPIString** name, CMPIStatus* rc) {
-    return guarded(rc, badData(), [&] {
+    const CMPIData data = guarded(rc, badData(), [&] {
         const auto& object = self(path);
         return asKey(namedDataAt(object.content->keys, index, name, arenaFor(object)));
     });
+    return toldIfNull(data, rc);
 }
 
 CMPICount getKeyCount(const CMPIObjectPath* path, CMPIStatus* rc) {

@@ -24,8 +24,13 @@ CMPIInstance* RequestScope::instance(const Instance& instance) {
     return objects.make<CMPIInstance>({instance, broker.classShape(instance.path.className), {}});
 }
 
-CMPIResult* RequestScope::result(ResultEvents& events) {
-    return objects.make<CMPIResult>({&events});
+CMPIResult* RequestScope::result(ResultEvents& events, const ResultRules& rules) {
+    return objects.make<CMPIResult>({&events, rules, {}});
+}
+
+bool RequestScope::isPathReleased(const CMPIResult* result) {
+    const auto* object = objectOf(result);
+    return object != nullptr && object->content->pathReleased != nullptr && *object->content->pathReleased;
 }
 
 Status statusFrom(const CMPIStatus& status) {

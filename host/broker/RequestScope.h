@@ -1,6 +1,7 @@
 #pragma once
 
 #include "broker/Broker.h"
+#include "broker/Contents.h"
 #include "model/ResultEvent.h"
 #include "model/Value.h"
 
@@ -26,10 +27,13 @@ public:
     CMPIInstance* instance(const Instance& instance);
 
     /** @param events receives what the provider returns; must live as long as the scope */
-    CMPIResult* result(ResultEvents& events);
+    CMPIResult* result(ResultEvents& events, const ResultRules& rules = {});
     ///@}
 
     Arena& arena() { return objects; }
+
+    /** Whether the provider released a path that such a result keeps. */
+    static bool isPathReleased(const CMPIResult* result);
 
 private:
     Broker& broker;

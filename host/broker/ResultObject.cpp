@@ -9,6 +9,13 @@ ResultEvents& events(const CMPIResult* result) {
     return *content(result).events;
 }
 
+void noticeRelease(ResultContent& result, const CMPIObjectPath* path) {
+    if (result.pathReleased == nullptr) {
+        result.pathReleased = std::make_shared<bool>(false);
+    }
+    objectOf(path)->released = result.pathReleased;
+}
+
 /** What a result collects belongs to its request, so nothing of it can outlive that. */
 CMPIResult* cloneResult(const CMPIResult* result, CMPIStatus* rc) {
     return guarded<CMPIResult*>(rc, nullptr, [&]() -> CMPIResult* {
@@ -26,20 +33,32 @@ CMPIStatus returnData(const CMPIResult* result, const CMPIValue* value, const CM
 
 CMPIStatus returnInstance(const CMPIResult* result, const CMPIInstance* instance) {
     return guarded([&] {
-        ResultEvents& target = events(result);
-        target.emplace_back(argument(instance).value);
+        const ResultContent& target = content(result);
+        if (target.rules.refusesInstances) {
+            throw Failure(CMPI_RC_ERR_NOT_SUPPORTED);
+        }
+        target.events->emplace_back(argument(instance).value);
     });
 }
 
 CMPIStatus returnObjectPath(const CMPIResult* result, const CMPIObjectPath* path) {
     return guarded([&] {
-        ResultEvents& target = events(result);
-        target.emplace_back(argument(path));
+        ResultContent& target = content(result);
+        target.events->emplace_back(argument(path));
+        if (target.rules.keepsPaths) {
+            noticeRelease(target, path);
+        }
     });
 }
 
 CMPIStatus returnDone(const CMPIResult* result) {
-    return guarded([&] { events(result).emplace_back(Done{}); });
+    return guarded([&] {
+        const ResultContent& target = content(result);
+        if (target.rules.refusesToBeEmpty && target.events->empty()) {
+            throw Failure(CMPI_RC_ERR_FAILED, "Too few objects delivered.");
+        }
+        target.events->emplace_back(Done{});
+    });
 }
 
 CMPIStatus returnError(const CMPIResult* result, const CMPIError* error) {

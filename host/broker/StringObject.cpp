@@ -5,7 +5,10 @@ namespace cimhost {
 namespace {
 
 const char* getCharPtr(const CMPIString* string, CMPIStatus* rc) {
-    return guarded<const char*>(rc, nullptr, [&] { return content(string).c_str(); });
+    return guarded<const char*>(rc, nullptr, [&]() -> const char* {
+        const auto& object = self(string);
+        return object.isHollow ? nullptr : object.content->c_str();
+    });
 }
 
 }  // namespace

@@ -21,6 +21,10 @@ std::string messageOf(const RawAnswer& answer, Operation operation) {
            std::to_string(answer.status.rc) + " and no message.";
 }
 
+constexpr auto nothingReturned = "The provider accepted CreateInstance, but returned neither path nor instance.";
+constexpr auto brokenResponse =
+    "The provider accepted CreateInstance, but returned no path: the client would have got a broken response.";
+
 template <class Kind>
 bool isKindOrSilent(const ResultEvent& event) {
     return std::holds_alternative<Kind>(event) || std::holds_alternative<Done>(event) ||
@@ -32,18 +36,62 @@ constexpr const char* kindName = "instance";
 template <>
 constexpr const char* kindName<ObjectPath> = "object path";
 
+bool returnedObject(const RawAnswer& answer) {
+    return std::any_of(answer.events.begin(), answer.events.end(), [](const ResultEvent& event) {
+        return std::holds_alternative<Instance>(event) || std::holds_alternative<ObjectPath>(event);
+    });
+}
+
+bool isReferenceOperation(Operation operation) {
+    return operation == Operation::references || operation == Operation::referenceNames;
+}
+
+/** What an object manager makes of an instance that it takes for a path: the namespace in the place of the class. */
+ObjectPath misread(const Instance& instance) {
+    return {{}, instance.path.nameSpace, instance.path.nameSpace, {}};
+}
+
 }  // namespace
 
+std::string fatality(const RawAnswer& answer, Operation operation) {
+    const Profile& profile = profileOf(answer.manager);
+    if (answer.threw && profile.escape == Escape::endOfProcess) {
+        return answer.status.message;
+    }
+    if (answer.releasedPath) {
+        return "The provider released the path that it had returned.";
+    }
+    const bool mustReturn = operation == Operation::createInstance && profile.created == CreationResult::pathRead;
+    if (mustReturn && answer.status.ok() && !returnedObject(answer)) {
+        return "The provider accepted CreateInstance, but returned nothing.";
+    }
+    return {};
+}
+
 Status statusOf(const RawAnswer& answer, Operation operation) {
-    return answer.status.ok() ? Status{} : Status{answer.status.rc, messageOf(answer, operation)};
+    const std::string reason = fatality(answer, operation);
+    if (!reason.empty()) {
+        return {CMPI_RC_ERR_FAILED, "The manager's provider process would have died: " + reason};
+    }
+    const Profile& profile = profileOf(answer.manager);
+    if (answer.threw && profile.escape == Escape::unknownError) {
+        return {CMPI_RC_ERR_FAILED, "Unknown error."};
+    }
+    const bool isEmptied =
+        profile.emptiesReferences && isReferenceOperation(operation) && answer.status.rc == CMPI_RC_ERR_NOT_SUPPORTED;
+    return answer.status.ok() || isEmptied ? Status{} : Status{answer.status.rc, messageOf(answer, operation)};
 }
 
 Status statusOf(const std::vector<RawAnswer>& answers, Operation operation) {
-    const bool anyOk = std::any_of(answers.begin(), answers.end(), [](const auto& each) { return each.status.ok(); });
+    std::vector<Status> all;
     for (const RawAnswer& answer : answers) {
-        const bool isPassedOver = anyOk && answer.status.rc == CMPI_RC_ERR_NOT_SUPPORTED;
-        if (!answer.status.ok() && !isPassedOver) {
-            return statusOf(answer, operation);
+        all.push_back(statusOf(answer, operation));
+    }
+    const bool anyOk = std::any_of(all.begin(), all.end(), [](const Status& each) { return each.ok(); });
+    for (const Status& each : all) {
+        const bool isPassedOver = anyOk && each.rc == CMPI_RC_ERR_NOT_SUPPORTED;
+        if (!each.ok() && !isPassedOver) {
+            return each;
         }
     }
     return {};
@@ -88,17 +136,19 @@ Answer<ObjectPath> createdPath(const Answer<std::vector<RawAnswer>>& answers) {
     if (!status.ok()) {
         return {status, {}};
     }
+    CreationResult wanted = CreationResult::pathOrInstance;
     for (const RawAnswer& answer : answers.value) {
+        wanted = profileOf(answer.manager).created;
         for (const ResultEvent& event : answer.events) {
             if (const auto* path = std::get_if<ObjectPath>(&event)) {
                 return {{}, *path};
             }
             if (const auto* instance = std::get_if<Instance>(&event)) {
-                return {{}, instance->path};
+                return {{}, wanted == CreationResult::pathRead ? misread(*instance) : instance->path};
             }
         }
     }
-    return {{CMPI_RC_ERR_FAILED, "The provider accepted CreateInstance, but returned neither path nor instance."}, {}};
+    return {{CMPI_RC_ERR_FAILED, wanted == CreationResult::pathOnly ? brokenResponse : nothingReturned}, {}};
 }
 
 template Answer<std::vector<Instance>> resultsOf(const Answer<std::vector<RawAnswer>>&, Operation);

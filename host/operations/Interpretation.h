@@ -1,5 +1,6 @@
 #pragma once
 
+#include <string>
 #include <vector>
 
 #include "operations/Request.h"
@@ -7,6 +8,12 @@
 // What a provider's raw answer means to who asked.
 
 namespace cimhost {
+
+/**
+ * Why the provider process of the object manager that asked would have ended, as a sentence; empty when it lives on.
+ * This host reports it instead.
+ */
+std::string fatality(const RawAnswer& answer, Operation operation);
 
 /** The status of an operation: OK, or the code that the provider answered, always with a text. */
 Status statusOf(const RawAnswer& answer, Operation operation);

@@ -47,12 +47,24 @@ Instance withKeys(const ObjectPath& path, const Instance& instance) {
     return complete;
 }
 
+/** Leaves one class of each provider, the first. */
+void dropSameProviders(std::vector<const ServedClass*>& classes) {
+    std::vector<const ServedClass*> kept;
+    std::copy_if(classes.begin(), classes.end(), std::back_inserter(kept), [&](const ServedClass* each) {
+        return std::none_of(kept.begin(), kept.end(), [&](const ServedClass* other) {
+            return other->address.location == each->address.location &&
+                   other->address.provider == each->address.provider;
+        });
+    });
+    classes = std::move(kept);
+}
+
 }  // namespace
 
 ObjectManager::ObjectManager(ObjectManagerOptions itsOptions, ProviderRegistry itsRegistry)
     : baseContext(std::move(itsOptions.context)),
       providers(std::move(itsRegistry)),
-      itsBroker({std::move(itsOptions.classShape), this, std::move(itsOptions.log), nullptr}),
+      itsBroker({std::move(itsOptions.classShape), this, std::move(itsOptions.log), nullptr, itsOptions.manager}),
       pool(itsBroker, std::move(itsOptions.libraries)) {}
 
 ObjectManager::~ObjectManager() = default;
@@ -63,7 +75,17 @@ void ObjectManager::completeContext(Request& request) const {
     }
     addIfMissing(request.context, CMPIInvocationFlags, {CMPI_uint32, false, false, {std::uint32_t{0}}});
     addIfMissing(request.context, CMPIInitNameSpace, textValue(request.path.nameSpace));
-    addIfMissing(request.context, CMPIPrincipal, textValue({}));
+    if (!itsBroker.profile().hollowTexts) {
+        addIfMissing(request.context, CMPIPrincipal, textValue({}));
+    }
+}
+
+ProviderAddress ObjectManager::addressOf(const ServedClass& served) const {
+    ProviderAddress address = served.address;
+    if (itsBroker.profile().startsProviderPerClass) {
+        address.forClass = foldedName(served.className);
+    }
+    return address;
 }
 
 Answer<std::vector<RawAnswer>> ObjectManager::run(Request request) {
@@ -80,21 +102,27 @@ Answer<std::vector<RawAnswer>> ObjectManager::runForInstance(const Request& requ
     if (served == nullptr) {
         return {noProvider(request, path.className), {}};
     }
-    return {{}, {runRequest(itsBroker, pool.get<CMPIInstanceMI>(served->address), request)}};
+    return {{}, {runRequest(itsBroker, pool.get<CMPIInstanceMI>(addressOf(*served)), request)}};
 }
 
 Answer<std::vector<RawAnswer>> ObjectManager::runForAssociation(Request request) {
     const auto associationClass = associationClassOf(request.operation);
     const std::optional<std::string> asked = request.filter.*associationClass;
-    const std::vector<const ServedClass*> found = associationsFor(request.path.nameSpace, asked);
+    std::vector<const ServedClass*> found = associationsFor(request.path.nameSpace, asked);
     if (found.empty()) {
         return {noProvider(request, asked.value_or(std::string{})), {}};
     }
+    const bool tellsClass = itsBroker.profile().fillsAssociationClass;
+    if (!tellsClass) {
+        dropSameProviders(found);
+    }
     std::vector<RawAnswer> answers;
     for (const ServedClass* served : found) {
-        const bool isAsked = asked && sameName(served->className, *asked);
-        request.filter.*associationClass = isAsked ? *asked : served->className;
-        answers.push_back(runRequest(itsBroker, pool.get<CMPIAssociationMI>(served->address), request));
+        if (tellsClass) {
+            const bool isAsked = asked && sameName(served->className, *asked);
+            request.filter.*associationClass = isAsked ? *asked : served->className;
+        }
+        answers.push_back(runRequest(itsBroker, pool.get<CMPIAssociationMI>(addressOf(*served)), request));
     }
     return {{}, std::move(answers)};
 }

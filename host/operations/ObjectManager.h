@@ -18,13 +18,14 @@ struct ObjectManagerOptions {
     ClassShapeLookup classShape{};                ///< none: no class is known; see BrokerOptions
     std::function<void(const LogRecord&)> log{};  ///< none: what providers log is dropped
     ContextEntries context{};                     ///< entries that every request's context has, such as CMPIPrincipal
+    Manager manager = Manager::standard;          ///< whose behaviour towards providers and clients is played
 };
 
 /**
  * The embedded object manager: sends each request to the provider that is registered for it, and tells what its
  * answer means. The operations are the same for a user and for a provider's up-call (UpCalls); they run on the
- * calling thread, may run on several threads at a time, and no lock is held while a provider runs, except by its
- * factory.
+ * calling thread, unless the manager that is played has it otherwise, may run on several threads at a time, and no lock
+ * is held while a provider runs, except by its factory.
  *
  * A status that is not OK comes with a text. Besides what providers answer:
  * CMPI_RC_ERR_INVALID_NAMESPACE and CMPI_RC_ERR_INVALID_CLASS when no provider is registered; CMPI_RC_ERR_FAILED
@@ -34,6 +35,8 @@ struct ObjectManagerOptions {
  *
  * The context of a request is what the caller gives, completed by the options' entries and by CMPIInvocationFlags
  * (0), CMPIInitNameSpace (the request's namespace) and CMPIPrincipal (empty).
+ *
+ * All of this is the standard manager; Profile tells in what others differ.
  */
 class ObjectManager : public UpCalls {
 public:
@@ -95,6 +98,7 @@ private:
     std::vector<const ServedClass*> associationsFor(const std::string& nameSpace,
                                                     const std::optional<std::string>& className) const;
     void completeContext(Request& request) const;
+    ProviderAddress addressOf(const ServedClass& served) const;
 
     ContextEntries baseContext;
     ProviderRegistry providers;

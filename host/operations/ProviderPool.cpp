@@ -1,5 +1,6 @@
 #include "operations/ProviderPool.h"
 
+#include <mutex>
 #include <tuple>
 #include <type_traits>
 #include <utility>
@@ -34,7 +35,8 @@ ProviderPool::~ProviderPool() {
 }
 
 bool ProviderPool::AddressLess::operator()(const ProviderAddress& left, const ProviderAddress& right) const {
-    return std::tie(left.location, left.provider) < std::tie(right.location, right.provider);
+    return std::tie(left.location, left.provider, left.forClass) <
+           std::tie(right.location, right.provider, right.forClass);
 }
 
 template <class Interface>
@@ -67,7 +69,7 @@ LoadedLibrary& ProviderPool::library(const std::string& location) {
 
 template <class Interface>
 Interface* ProviderPool::get(const ProviderAddress& address) {
-    const std::lock_guard<std::recursive_mutex> lock(mutex);
+    const std::lock_guard<ChainMutex> lock(mutex);
     Provider& provider = providers[address];
     Interface*& interface = member<Interface>(provider);
     if (interface == nullptr) {

@@ -2,12 +2,12 @@
 
 #include <map>
 #include <memory>
-#include <mutex>
 #include <string>
 
 #include "operations/Interfaces.h"
 #include "operations/LoadedLibrary.h"
 #include "operations/ProviderRegistry.h"
+#include "operations/RequestThread.h"
 
 namespace cimhost {
 
@@ -51,7 +51,7 @@ private:
 
     Broker& broker;
     LibraryOptions options;
-    std::recursive_mutex mutex;  ///< recursive: a factory may make a request that needs another provider
+    ChainMutex mutex;  ///< held while a factory runs, which may make a request that needs another provider
     std::map<std::string, std::unique_ptr<LoadedLibrary>> libraries;  ///< by location
     std::map<ProviderAddress, Provider, AddressLess> providers;
 };

@@ -21,7 +21,7 @@ ProviderRegistry::ProviderRegistry(const std::vector<ProviderRegistration>& regi
 }
 
 void ProviderRegistry::add(const ProviderRegistration& registration) {
-    const ProviderAddress address{registration.location, registration.provider};
+    const ProviderAddress address{registration.location, registration.provider, {}};
     for (const std::string& nameSpace : registration.nameSpaces) {
         if (registration.instance) {
             add({nameSpace, registration.className, InterfaceKind::instance, address});

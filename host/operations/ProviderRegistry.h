@@ -13,6 +13,7 @@ namespace cimhost {
 struct ProviderAddress {
     std::string location{};  ///< see findLibrary()
     std::string provider{};  ///< prefix of its factories
+    std::string forClass{};  ///< the class that it is started for; empty: for all that it serves
 };
 
 /** A class that a provider serves in a namespace. */

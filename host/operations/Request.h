@@ -4,6 +4,7 @@
 
 #include <string>
 
+#include "broker/Profile.h"
 #include "broker/UpCalls.h"
 #include "model/PropertyList.h"
 #include "model/ResultEvent.h"
@@ -44,10 +45,12 @@ struct Request {
 
 /** Everything that one provider did in answer to a request. */
 struct RawAnswer {
-    Status status{};          ///< as the provider answered it; CMPI_RC_ERR_FAILED when an exception left it
-    bool hasMessage = false;  ///< whether the status carried a message, even an empty one
-    bool threw = false;       ///< whether an exception left the provider
-    ResultEvents events{};    ///< what it returned, in order, also before a failure
+    Status status{};                      ///< as the provider answered it; CMPI_RC_ERR_FAILED when an exception left it
+    bool hasMessage = false;              ///< whether the status carried a message, even an empty one
+    bool threw = false;                   ///< whether an exception left the provider
+    bool releasedPath = false;            ///< whether the provider released a path that the manager keeps
+    Manager manager = Manager::standard;  ///< the object manager that asked, whose rules say what the answer means
+    ResultEvents events{};                ///< what it returned, in order, also before a failure
 
     int doneCount() const { return cimhost::doneCount(events); }
 };

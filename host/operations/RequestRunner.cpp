@@ -3,6 +3,8 @@
 #include <stdexcept>
 
 #include "broker/PropertyLists.h"
+#include "operations/HandedOver.h"
+#include "operations/RequestThread.h"
 
 namespace cimhost {
 namespace {
@@ -23,64 +25,92 @@ const char* textOf(const std::optional<std::string>& text) {
     throw std::invalid_argument(std::string("not an operation of this interface: ") + nameOf(operation));
 }
 
+/** What the manager insists on in the answer to an operation. */
+ResultRules rulesOf(const Profile& profile, Operation operation) {
+    const bool creates = operation == Operation::createInstance;
+    return {creates && profile.created == CreationResult::pathOnly,
+            operation == Operation::getInstance && profile.refusesEmptyGet, creates && profile.keepsReturnedPath};
+}
+
+CMPIStatus call(CMPIInstanceMI* interface, const Request& request, RequestScope& scope, const CMPIContext* context,
+                const CMPIResult* result) {
+    CPropertyList list(request.properties);
+    const char** properties = list.get();
+    const CMPIObjectPath* path = scope.objectPath(request.path);
+    const auto& table = *interface->ft;
+    switch (request.operation) {
+        case Operation::enumerateInstances:
+            return callEntry(table.enumerateInstances, interface, context, result, path, properties);
+        case Operation::enumerateInstanceNames:
+            return callEntry(table.enumerateInstanceNames, interface, context, result, path);
+        case Operation::getInstance:
+            return callEntry(table.getInstance, interface, context, result, path, properties);
+        case Operation::createInstance:
+            return callEntry(table.createInstance, interface, context, result, path, scope.instance(request.instance));
+        case Operation::modifyInstance:
+            return callEntry(table.modifyInstance, interface, context, result, path, scope.instance(request.instance),
+                             properties);
+        default:
+            return callEntry(table.deleteInstance, interface, context, result, path);
+    }
+}
+
+CMPIStatus call(CMPIAssociationMI* interface, const Request& request, RequestScope& scope, const CMPIContext* context,
+                const CMPIResult* result) {
+    CPropertyList list(request.properties);
+    const char** properties = list.get();
+    const CMPIObjectPath* path = scope.objectPath(request.path);
+    const auto& table = *interface->ft;
+    const char* associationClass = textOf(request.filter.associationClass);
+    const char* resultClass = textOf(request.filter.resultClass);
+    const char* role = textOf(request.filter.role);
+    const char* resultRole = textOf(request.filter.resultRole);
+    switch (request.operation) {
+        case Operation::associators:
+            return callEntry(table.associators, interface, context, result, path, associationClass, resultClass, role,
+                             resultRole, properties);
+        case Operation::associatorNames:
+            return callEntry(table.associatorNames, interface, context, result, path, associationClass, resultClass,
+                             role, resultRole);
+        case Operation::references:
+            return callEntry(table.references, interface, context, result, path, resultClass, role, properties);
+        default:
+            return callEntry(table.referenceNames, interface, context, result, path, resultClass, role);
+    }
+}
+
+template <class Interface>
+RawAnswer run(Broker& broker, Interface* interface, const Request& request) {
+    return onRequestThread(broker, [&] {
+        return runCall(
+            broker, request.context,
+            [&](RequestScope& scope, const CMPIContext* context, const CMPIResult* result) {
+                return call(interface, request, scope, context, result);
+            },
+            rulesOf(broker.profile(), request.operation));
+    });
+}
+
+template <class Interface>
+RawAnswer runAsManager(Broker& broker, Interface* interface, const Request& request) {
+    return broker.profile().manager == Manager::standard ? run(broker, interface, request)
+                                                         : run(broker, interface, handedOver(request, broker));
+}
+
 }  // namespace
 
 RawAnswer runRequest(Broker& broker, CMPIInstanceMI* interface, const Request& request) {
     if (isAssociationOperation(request.operation)) {
         wrongInterface(request.operation);
     }
-    return runCall(broker, request.context,
-                   [&](RequestScope& scope, const CMPIContext* context, const CMPIResult* result) {
-                       CPropertyList list(request.properties);
-                       const char** properties = list.get();
-                       const CMPIObjectPath* path = scope.objectPath(request.path);
-                       const auto& table = *interface->ft;
-                       switch (request.operation) {
-                           case Operation::enumerateInstances:
-                               return callEntry(table.enumerateInstances, interface, context, result, path, properties);
-                           case Operation::enumerateInstanceNames:
-                               return callEntry(table.enumerateInstanceNames, interface, context, result, path);
-                           case Operation::getInstance:
-                               return callEntry(table.getInstance, interface, context, result, path, properties);
-                           case Operation::createInstance:
-                               return callEntry(table.createInstance, interface, context, result, path,
-                                                scope.instance(request.instance));
-                           case Operation::modifyInstance:
-                               return callEntry(table.modifyInstance, interface, context, result, path,
-                                                scope.instance(request.instance), properties);
-                           default:
-                               return callEntry(table.deleteInstance, interface, context, result, path);
-                       }
-                   });
+    return runAsManager(broker, interface, request);
 }
 
 RawAnswer runRequest(Broker& broker, CMPIAssociationMI* interface, const Request& request) {
     if (!isAssociationOperation(request.operation)) {
         wrongInterface(request.operation);
     }
-    return runCall(
-        broker, request.context, [&](RequestScope& scope, const CMPIContext* context, const CMPIResult* result) {
-            CPropertyList list(request.properties);
-            const char** properties = list.get();
-            const CMPIObjectPath* path = scope.objectPath(request.path);
-            const auto& table = *interface->ft;
-            const char* associationClass = textOf(request.filter.associationClass);
-            const char* resultClass = textOf(request.filter.resultClass);
-            const char* role = textOf(request.filter.role);
-            const char* resultRole = textOf(request.filter.resultRole);
-            switch (request.operation) {
-                case Operation::associators:
-                    return callEntry(table.associators, interface, context, result, path, associationClass, resultClass,
-                                     role, resultRole, properties);
-                case Operation::associatorNames:
-                    return callEntry(table.associatorNames, interface, context, result, path, associationClass,
-                                     resultClass, role, resultRole);
-                case Operation::references:
-                    return callEntry(table.references, interface, context, result, path, resultClass, role, properties);
-                default:
-                    return callEntry(table.referenceNames, interface, context, result, path, resultClass, role);
-            }
-        });
+    return runAsManager(broker, interface, request);
 }
 
 }  // namespace cimhost

@@ -46,39 +46,14 @@ private:
     std::map<std::string, cimhost::Answer<std::vector<cimhost::Instance>>> served;
 };
 
-void looseFunctions(cimhost::FunctionTables& tables) {
-    tables.broker.brokerVersion = 0;
-    tables.encapsulation.ftVersion = 1;
-    tables.encapsulation.newCMPIError = nullptr;
-    tables.encapsulation.openMessageFile = nullptr;
-    tables.encapsulation.closeMessageFile = nullptr;
-    tables.encapsulation.getMessage2 = nullptr;
-    tables.threads.joinThread = nullptr;
-    tables.threads.exitThread = nullptr;
-    tables.threads.cancelThread = nullptr;
-    tables.threads.threadSleep = nullptr;
-    tables.threads.signalCondition = nullptr;
-    tables.memory.cmpiMalloc = nullptr;
-    tables.memory.cmpiCalloc = nullptr;
-    tables.memory.cmpiRealloc = nullptr;
-    tables.memory.cmpiStrDup = nullptr;
-    tables.memory.cmpiFree = nullptr;
-    tables.memory.freeInstance = nullptr;
-    tables.memory.freeObjectPath = nullptr;
-    tables.memory.freeArgs = nullptr;
-    tables.memory.freeString = nullptr;
-    tables.memory.freeArray = nullptr;
-    tables.memory.freeDateTime = nullptr;
-    tables.memory.freeSelectExp = nullptr;
-}
-
 }  // namespace
 
 /** What a RecordingBroker is made of. */
 struct RecordingBroker::State {
     State()
         : tables(recordingTables()),
-          broker({nullptr, &upCalls, nullptr, &tables}),
+          broker({[this](const std::string& name) { return shapes ? shapes(name) : nullptr; }, &upCalls, nullptr,
+                  &tables, Manager::standard}),
           handle(*broker.handle()),
           objects(tables) {}
 
@@ -92,6 +67,7 @@ struct RecordingBroker::State {
 
     cimhost::FunctionTables tables;
     ServedInstances upCalls;
+    cimhost::ClassShapeLookup shapes;
     cimhost::Broker broker;
     CMPIBroker handle;
     cimhost::Arena objects;  ///< made for the test
@@ -216,11 +192,20 @@ CMPIInstance* RecordingBroker::instance(const cimhost::Instance& instance) {
 }
 
 void RecordingBroker::poseAs(Manager manager) {
-    if (manager == Manager::sfcb) {
-        looseFunctions(state->tables);
-    } else {
+    const cimhost::Profile& profile = cimhost::profileOf(manager);
+    cimhost::applyGaps(profile, state->tables);
+    if (profile.gaps == cimhost::BrokerGaps::memoryTable) {
         state->handle.mft = nullptr;
     }
+}
+
+void RecordingBroker::behaveAs(Manager manager) {
+    poseAs(manager);
+    state->broker.play(manager);
+}
+
+void RecordingBroker::know(cimhost::ClassShapeLookup shapes) {
+    state->shapes = std::move(shapes);
 }
 
 void RecordingBroker::serve(const std::string& className, std::vector<cimhost::Instance> instances) {

@@ -17,11 +17,7 @@ struct RecordedCall {
     std::vector<std::string> arguments;  ///< those that say something: see RecordingBroker
 };
 
-/** Object managers that a RecordingBroker can pose as, by what providers see of them. */
-enum class Manager {
-    openPegasus,  ///< version 200, but no memory table
-    sfcb          ///< version fields 0 and 1, and many functions of the standard missing: null pointers
-};
+using cimhost::Manager;
 
 /**
  * A CMPI broker for contract tests of a provider: a real one (cimhost::Broker) that writes down every call and can
@@ -112,8 +108,20 @@ public:
     CMPIInstance* instance(const cimhost::Instance& instance);
     ///@}
 
-    /** Looks like that object manager from now on. */
+    /** @name Object managers
+     * Both before the provider has the handle.
+     */
+    ///@{
+
+    /** Looks like that object manager from now on: versions, functions that are null. */
     void poseAs(Manager manager);
+
+    /** Looks like it and treats providers as it does, in requests that are run with broker(); see cimhost::Profile. */
+    void behaveAs(Manager manager);
+
+    /** Knows classes from now on: instances of theirs begin with their keys, and a manager can complete them. */
+    void know(cimhost::ClassShapeLookup shapes);
+    ///@}
 
     /** @name Up-calls
      * What the broker's enumerateInstances and enumerateInstanceNames answer for a class, in any namespace: the

@@ -271,9 +271,8 @@ void recordErrorTable(cimhost::FunctionTables& tables) {
 
 #undef RECORD
 
-}  // namespace
-
-cimhost::FunctionTables recordingTables() {
+/** Made once: making them sets the names by which functions of all brokers are recorded. */
+cimhost::FunctionTables makeTables() {
     cimhost::FunctionTables tables = cimhost::standardTables();
     recordBrokerTable(tables);
     recordEncapsulationTable(tables);
@@ -289,6 +288,13 @@ cimhost::FunctionTables recordingTables() {
     recordContextTable(tables);
     recordResultTable(tables);
     recordErrorTable(tables);
+    return tables;
+}
+
+}  // namespace
+
+cimhost::FunctionTables recordingTables() {
+    static const cimhost::FunctionTables tables = makeTables();
     return tables;
 }
 

@@ -179,6 +179,24 @@ TEST_F(RecordingBrokerTest, PosesAsOpenPegasus) {
     EXPECT_EQ(handle()->bft->brokerVersion, 200U);
 }
 
+TEST_F(RecordingBrokerTest, APoseIsLooksOnly) {
+    recorder.poseAs(Manager::sfcb);
+    EXPECT_EQ(recorder.broker().profile().manager, Manager::standard);
+    recorder.behaveAs(Manager::sfcb);
+    EXPECT_EQ(recorder.broker().profile().manager, Manager::sfcb);
+    EXPECT_EQ(handle()->bft->brokerVersion, 0U);
+    EXPECT_TRUE(recorder.calls().empty());
+}
+
+TEST_F(RecordingBrokerTest, KnowsTheClassesThatItIsTold) {
+    recorder.know([](const std::string& name) {
+        return std::make_shared<cimhost::ClassShape>(
+            cimhost::ClassShape{name, {{"Size", CMPI_uint32, false, false, {}}}, {}});
+    });
+    CMPIInstance* instance = handle()->eft->newInstance(handle(), newPath(), &status);
+    EXPECT_EQ(instance->ft->setProperty(instance, "Length", chars("x"), CMPI_chars).rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);
+}
+
 TEST_F(RecordingBrokerTest, RecordsMessages) {
     const CMPIString* message =
         handle()->eft->getMessage(handle(), "id", "number $0", &status, 1, CMPI_uint32, CMPIUint32{7});

@@ -29,7 +29,7 @@ int refusals = 2;
 
 KIT_EXPORT CMPIInstanceMI* _Generic_Create_InstanceMI(const CMPIBroker* itsBroker, const CMPIContext*, const char* name,
                                                       CMPIStatus*) {
-    broker = itsBroker;
+    kit::keep(broker, itsBroker);
     providerName = name;
     return &interface;
 }

@@ -58,6 +58,13 @@ inline void log(const CMPIBroker* broker, const char* text) {
     broker->eft->logMessage(broker, CMPI_SEV_INFO, "provider", text, nullptr);
 }
 
+/** Keeps the broker of a factory; factories may be called again while requests run, and must not write then. */
+inline void keep(const CMPIBroker*& kept, const CMPIBroker* broker) {
+    if (kept != broker) {
+        kept = broker;
+    }
+}
+
 }  // namespace kit
 
 #define KIT_EXPORT extern "C" __attribute__((visibility("default")))

@@ -215,14 +215,14 @@ CMPIAssociationMI associationMI{nullptr, &associationTable};
 }  // namespace
 
 KIT_EXPORT CMPIInstanceMI* Sample_Create_InstanceMI(const CMPIBroker* itsBroker, const CMPIContext*, CMPIStatus*) {
-    broker = itsBroker;
+    kit::keep(broker, itsBroker);
     kit::log(broker, "instance factory");
     return &instanceMI;
 }
 
 KIT_EXPORT CMPIAssociationMI* Sample_Create_AssociationMI(const CMPIBroker* itsBroker, const CMPIContext*,
                                                           CMPIStatus*) {
-    broker = itsBroker;
+    kit::keep(broker, itsBroker);
     kit::log(broker, "association factory");
     return &associationMI;
 }

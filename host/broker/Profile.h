@@ -1,0 +1,68 @@
+#pragma once
+
+#include <optional>
+#include <string_view>
+
+#include "broker/FunctionTables.h"
+
+namespace cimhost {
+
+/** Object managers that this host can play. */
+enum class Manager {
+    standard,     ///< the host itself: what the standard promises, and helpful where it leaves a choice
+    sfcb,         ///< as SFCB 1.3 was seen to behave
+    openPegasus,  ///< as OpenPegasus was seen to behave
+};
+
+/** Functions that the broker lacks. */
+enum class BrokerGaps { none, someFunctions, memoryTable };
+
+/** The thread on which a request reaches its provider. */
+enum class RequestThread {
+    callers,          ///< that of who asks
+    ownUnlessNested,  ///< one of its own; an up-call runs on the thread of the provider that asks
+    own,              ///< one of its own, up-calls too
+};
+
+/** What becomes of an exception that leaves a provider. */
+enum class Escape { failure, endOfProcess, unknownError };
+
+/** What a provider must return from CreateInstance. */
+enum class CreationResult {
+    pathOrInstance,
+    pathRead,  ///< whatever comes first is read as a path, nothing at all ends the process
+    pathOnly   ///< instances are refused
+};
+
+/** What providers and clients meet under an object manager, where managers differ. */
+struct Profile {
+    Manager manager;
+    const char* name;  ///< on command lines
+    unsigned int brokerVersion;
+    int encapsulationVersion;
+    BrokerGaps gaps;
+    RequestThread thread;
+    Escape escape;
+    CreationResult created;
+    bool completesInstances;      ///< all properties of the class are there at creation and modification, unset: null
+    bool hollowTexts;             ///< unset texts, principal and role are string objects without characters
+    bool unreadableCreationKeys;  ///< keys of the path are counted at creation, but have no value
+    bool namesAllProperties;      ///< the property list is never null, and that of a modification has the keys
+    bool fillsAssociationClass;   ///< a provider is told the association class also when the client names none
+    bool refusesEmptyGet;         ///< returnDone fails in GetInstance before an instance was returned
+    bool keepsReturnedPath;       ///< a path returned from CreateInstance must not be released
+    bool emptiesReferences;       ///< references that are not supported are answered as none
+    bool trimsBlanks;             ///< at both ends of texts from clients
+    bool trimsOutsideAscii;       ///< bytes outside ASCII go, too
+    bool startsProviderPerClass;  ///< factories are called once for every class that is asked for
+};
+
+const Profile& profileOf(Manager manager);
+
+/** The manager of that name, "standard", "sfcb" or "pegasus"; none for another name. */
+std::optional<Manager> managerNamed(std::string_view name);
+
+/** Makes function tables look like the manager's: versions, and null pointers where it has no function. */
+void applyGaps(const Profile& profile, FunctionTables& tables);
+
+}  // namespace cimhost

@@ -1,0 +1,40 @@
+#include "operations/RequestThread.h"
+
+namespace cimhost {
+namespace {
+
+/** The chain of another thread that this one works for; null: none. */
+RequestChain& joinedChain() {
+    thread_local RequestChain chain = nullptr;
+    return chain;
+}
+
+}  // namespace
+
+RequestChain requestChain() {
+    return joinedChain() == nullptr ? &joinedChain() : joinedChain();
+}
+
+ChainMember::ChainMember(RequestChain chain) {
+    joinedChain() = chain;
+}
+
+ChainMember::~ChainMember() {
+    joinedChain() = nullptr;
+}
+
+void ChainMutex::lock() {
+    const RequestChain chain = requestChain();
+    std::unique_lock<std::mutex> lock(mutex);
+    freed.wait(lock, [&] { return depth == 0 || owner == chain; });
+    owner = chain;
+    ++depth;
+}
+
+void ChainMutex::unlock() {
+    const std::lock_guard<std::mutex> lock(mutex);
+    --depth;
+    freed.notify_one();
+}
+
+}  // namespace cimhost

@@ -1,0 +1,70 @@
+#include <atomic>
+#include <thread>
+
+#include "OperationsFixture.h"
+
+// Many clients at a time, as every manager: providers are started, ask each other, fail and throw, and every client
+// gets the answers to its own requests.
+
+namespace {
+
+using cimhost::Manager;
+using testsupport::textOf;
+
+constexpr int clients = 8;
+constexpr int rounds = 25;
+
+class ConcurrencyTest : public OperationsTest, public testing::WithParamInterface<Manager> {
+protected:
+    ConcurrencyTest() { options.manager = GetParam(); }
+
+    /** The manager, with a log that takes lines from several threads. */
+    cimhost::ObjectManager& shared() {
+        if (!started) {
+            options.libraries.searchPath = {TEST_PROVIDERS};
+            options.log = [this](const cimhost::LogRecord&) { ++logged; };
+            started = std::make_unique<cimhost::ObjectManager>(options, registry);
+        }
+        return *started;
+    }
+
+    void runClient(int number) {
+        const int depth = number % 4 + 1;
+        const auto nested = manager().getInstance({}, named("Sample_Recursive", std::to_string(depth).c_str()), {});
+        const std::string expected = std::to_string(depth) + ">Below=" + std::to_string(depth - 1);
+        EXPECT_EQ(textOf(nested.value.properties, "Below").value_or("").substr(0, expected.size()), expected);
+        const auto other = manager().enumerateInstances({}, classPath("Sample_CallsOther_Thing"), {});
+        ASSERT_EQ(other.value.size(), 1U) << other.status.message;
+        EXPECT_EQ(other.value.front().path.className, "Other_Thing");
+        EXPECT_EQ(manager().enumerateInstances({}, classPath("Sample_Failing"), {}).status.message, "not for you");
+        EXPECT_EQ(manager().enumerateInstances({}, classPath("Sample_Throwing"), {}).status.rc, CMPI_RC_ERR_FAILED);
+        const std::string role = "role " + std::to_string(number);
+        const auto far = manager().associators({}, named("Sample_Thing", "x"), {"Sample_Link", {}, role, {}}, {});
+        ASSERT_EQ(far.value.size(), 1U) << far.status.message;
+        EXPECT_EQ(textOf(far.value.front().properties, "Asked"), "Sample_Link,none," + role + ",none");
+    }
+
+    std::atomic<int> logged{0};
+};
+
+TEST_P(ConcurrencyTest, EveryClientGetsItsOwnAnswers) {
+    shared();
+    std::vector<std::thread> threads;
+    for (int client = 0; client < clients; ++client) {
+        threads.emplace_back([this, client] {
+            for (int round = 0; round < rounds; ++round) {
+                runClient(client);
+            }
+        });
+    }
+    for (std::thread& each : threads) {
+        each.join();
+    }
+    EXPECT_GT(logged, 0) << "factories log";
+}
+
+INSTANTIATE_TEST_SUITE_P(Managers, ConcurrencyTest,
+                         testing::Values(Manager::standard, Manager::sfcb, Manager::openPegasus),
+                         [](const auto& each) { return std::string(cimhost::profileOf(each.param).name); });
+
+}  // namespace

@@ -1,0 +1,51 @@
+#include "operations/RequestThread.h"
+
+#include <gtest/gtest.h>
+
+#include <mutex>
+#include <stdexcept>
+#include <thread>
+#include <vector>
+
+namespace {
+
+TEST(RequestThread, AThreadBelongsToTheChainOfWhoStartedIt) {
+    const cimhost::RequestChain mine = cimhost::requestChain();
+    EXPECT_EQ(cimhost::onOwnThread([] { return cimhost::requestChain(); }), mine);
+    cimhost::RequestChain other = mine;
+    std::thread([&] { other = cimhost::requestChain(); }).join();
+    EXPECT_NE(other, mine);
+}
+
+TEST(RequestThread, WhatIsThrownThereIsThrownHere) {
+    EXPECT_THROW(cimhost::onOwnThread([]() -> int { throw std::runtime_error("x"); }), std::runtime_error);
+}
+
+TEST(ChainMutex, AChainLocksItAgainOnAnotherThread) {
+    cimhost::ChainMutex mutex;
+    const std::lock_guard<cimhost::ChainMutex> lock(mutex);
+    EXPECT_TRUE(cimhost::onOwnThread([&] {
+        const std::lock_guard<cimhost::ChainMutex> again(mutex);
+        return true;
+    }));
+}
+
+TEST(ChainMutex, KeepsOtherChainsOut) {
+    cimhost::ChainMutex mutex;
+    int counter = 0;
+    std::vector<std::thread> threads;
+    for (int i = 0; i < 4; ++i) {
+        threads.emplace_back([&] {
+            for (int j = 0; j < 500; ++j) {
+                const std::lock_guard<cimhost::ChainMutex> lock(mutex);
+                ++counter;
+            }
+        });
+    }
+    for (std::thread& each : threads) {
+        each.join();
+    }
+    EXPECT_EQ(counter, 2000);
+}
+
+}  // namespace
