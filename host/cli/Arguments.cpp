@@ -24,6 +24,10 @@ a shell keeps only inside of quotes:
   cimhost ai 'root/cimv2:Some_System.Name="host"' --assoc-class Some_Association
   cimhost --format json ein Some_Class
   cimhost --schema my.mof --registration my.reg --library-path build/lib ei My_Class
+  cimhost --as sfcb ci 'Some_Class.InstanceID="2"'
+
+With --as, the providers meet the behaviour of another object manager. What would end its provider process is reported
+as an error.
 
 Environment: CIMHOST_SCHEMA, CIMHOST_REGISTRATION and CIMHOST_LIBRARY_PATH hold files or directories, separated
 by colons, for what the options do not name.
@@ -79,6 +83,14 @@ Format formatNamed(const std::string& word) {
     return found->second;
 }
 
+Manager managerCalled(const std::string& word) {
+    const std::optional<Manager> manager = managerNamed(word);
+    if (!manager) {
+        throw CLI::ValidationError("--as", word + " is not one of standard, sfcb and pegasus");
+    }
+    return *manager;
+}
+
 void addCommonOptions(CLI::App& app, Arguments& arguments) {
     app.add_option("--schema", arguments.schemas, "MOF file with classes, or a directory of them (repeatable)")
         ->type_name("FILE")
@@ -96,6 +108,10 @@ void addCommonOptions(CLI::App& app, Arguments& arguments) {
     const auto setFormat = [&arguments](const std::string& word) { arguments.format = formatNamed(word); };
     app.add_option_function<std::string>("--format", setFormat, "Form of the output: text (default), json or mof")
         ->type_name("FORM");
+    const auto setManager = [&arguments](const std::string& word) { arguments.manager = managerCalled(word); };
+    app.add_option_function<std::string>("--as", setManager,
+                                         "Object manager to behave like: standard (default), sfcb or pegasus")
+        ->type_name("MANAGER");
     app.add_flag("--raw", arguments.raw,
                  "Show exactly what the provider did: its status, each object it returned, its calls of returnDone");
 }

@@ -24,6 +24,7 @@ struct Arguments {
     std::string nameSpace = "root/cimv2";
     Format format = Format::text;
     bool raw = false;
+    Manager manager = Manager::standard;
 };
 
 /** What became of reading a command line: arguments to act on, or an end with something to say. */

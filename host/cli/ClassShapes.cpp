@@ -7,7 +7,8 @@ std::shared_ptr<const ClassShape> shapeOf(const Schema& schema, const Class& kno
     auto shape = std::make_shared<ClassShape>();
     shape->name = known.name;
     for (const Property& property : known.properties) {
-        shape->properties.push_back({property.name, property.type, property.isArray, property.isKey()});
+        shape->properties.push_back(
+            {property.name, property.type, property.isArray, property.isKey(), property.referenceClass});
     }
     for (const Class* super = schema.findClass(known.superclass); super != nullptr;
          super = schema.findClass(super->superclass)) {

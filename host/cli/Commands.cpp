@@ -121,6 +121,7 @@ Outcome runRequest(const Arguments& arguments, const Locations& locations, const
         ObjectManagerOptions options;
         options.libraries.searchPath = locations.libraryPaths;
         options.classShape = classShapes(schema);
+        options.manager = arguments.manager;
         ObjectManager manager(std::move(options), registry);
         const Answers answers = manager.run(request);
         return arguments.raw ? showRaw(answers, request.operation, arguments.format)

@@ -113,6 +113,14 @@ void joinKeys(Request& request, const Schema& schema) {
     properties = std::move(complete);
 }
 
+std::vector<std::string> namesOf(const std::vector<NamedValue>& values) {
+    std::vector<std::string> names;
+    for (const NamedValue& each : values) {
+        names.push_back(each.name);
+    }
+    return names;
+}
+
 void addInstance(Request& request, const Arguments& arguments, const Schema& schema) {
     request.instance.properties = readValues(arguments, request.path, schema);
     if (request.operation == Operation::createInstance) {
@@ -121,9 +129,8 @@ void addInstance(Request& request, const Arguments& arguments, const Schema& sch
         if (request.instance.properties.empty()) {
             throw UsageError("there is nothing to modify: write NAME=VALUE or --null NAME");
         }
-        request.properties.emplace();
-        for (const NamedValue& property : request.instance.properties) {
-            request.properties->push_back(property.name);
+        if (arguments.manager != Manager::sfcb) {  // the clients that come with it send no list
+            request.properties = namesOf(request.instance.properties);
         }
     }
     request.instance.path = request.path;
