@@ -18,6 +18,8 @@ class ConcurrencyTest : public OperationsTest, public testing::WithParamInterfac
 protected:
     ConcurrencyTest() { options.manager = GetParam(); }
 
+    void TearDown() override { started.reset(); }  // while there is something to log to
+
     /** The manager, with a log that takes lines from several threads. */
     cimhost::ObjectManager& shared() {
         if (!started) {
