@@ -3,12 +3,11 @@
 #include "AssetSupport.h"
 #include "KO/Mutex.h"
 
-#include <gmock/gmock.h>
+#include <algorithm>
 
 namespace {
 
 using namespace providerTest;
-using testing::Contains;
 
 const AssetIDDetails::PersonalizedPair nullPair{"Null", "Null"};
 

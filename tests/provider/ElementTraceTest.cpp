@@ -7,7 +7,6 @@
 namespace {
 
 using namespace providerTest;
-using testing::Contains;
 using testing::ElementsAre;
 
 template <class Side>

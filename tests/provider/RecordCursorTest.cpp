@@ -8,7 +8,6 @@ namespace {
 
 using namespace providerTest;
 using testing::ElementsAre;
-using testing::IsEmpty;
 
 template <class Side>
 class RecordCursor : public RecordStore<Side> {

@@ -24,6 +24,7 @@ void writeConfiguration(const fs::path& file) {
            << dataDirectory().string() << "\"\n[product]\nname = \"Test Agent\"\nversion = \"" << version << "\"\n"
            << "build_number = \"77\"\nidentifying_number = \"ID-1\"\nvendor = \"VEL\"\n"
            << "[log]\ndestination = \"" << logFile().string() << "\"\nlog_level = 9999\ntrace_level = 9999\n"
+           << "rotation_size = 2147483647\n"
            << "[instrumentation]\ndiscover = false\n"
            << agentNodes;
 }

@@ -10,6 +10,7 @@
 #include <cstring>
 #include <memory>
 #include <stdexcept>
+
 // The built library as a file, and its coming and going.
 
 namespace contract {
@@ -17,7 +18,6 @@ namespace {
 
 using testing::ElementsAre;
 using testing::HasSubstr;
-using testing::IsEmpty;
 using testing::Not;
 using testing::UnorderedElementsAre;
 using testsupport::readFile;
