@@ -51,7 +51,7 @@ std::map<std::string, std::string>& values() {
     return state().values;
 }
 
-void insteadOf(const std::string& call, std::function<void()> action) {
+void before(const std::string& call, std::function<void()> action) {
     state().actions[call] = std::move(action);
 }
 

@@ -20,8 +20,8 @@ bool locked();
 /** What is read under each key; a key not there reads as empty. */
 std::map<std::string, std::string>& values();
 
-/** Runs an action instead of each call that reads so, arguments included. It may throw. */
-void insteadOf(const std::string& call, std::function<void()> action);
+/** Runs an action before each call that reads so, arguments included. One that throws is the call's failure. */
+void before(const std::string& call, std::function<void()> action);
 
 /** Drops calls, values and actions. */
 void forget();

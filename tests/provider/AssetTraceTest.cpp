@@ -1,17 +1,12 @@
-// What the asset element tells of its work, and that it waits for the file lock.
+// What the asset element tells of its work.
 
 #include "AssetSupport.h"
-#include "KO/Mutex.h"
 
 #include <gmock/gmock.h>
-
-#include <atomic>
-#include <thread>
 
 namespace {
 
 using namespace providerTest;
-using testing::Contains;
 using testing::ElementsAre;
 
 constexpr const char* source = "AssetIDDetails.cpp";
@@ -97,50 +92,6 @@ TEST_F(AssetTrace, TellsEntryAndExitOfItsOperations) {
         expected.push_back(exiting(function, source));
     }
     EXPECT_EQ(texts(), expected);
-}
-
-/** Waits until a function of the unit has told of its entry. */
-void awaitEntry(const std::string& function) {
-    while (textsOf(source, function).empty()) {
-        std::this_thread::yield();
-    }
-}
-
-using AssetLock = AssetFile;
-
-TEST_F(AssetLock, KeepsAnotherThreadFromCreatingTheFile) {
-    KO::_fileMutex.lock(withoutLimit);
-    std::atomic<bool> made{false};
-    std::thread other([&] {
-        const AssetIDDetails element;
-        made = true;
-    });
-    awaitEntry("getFileName");
-    EXPECT_FALSE(made);
-    EXPECT_FALSE(std::filesystem::exists(path()));
-    KO::_fileMutex.unlock();
-    other.join();
-    EXPECT_TRUE(made);
-    EXPECT_TRUE(std::filesystem::exists(path()));
-}
-
-TEST_F(AssetLock, KeepsAnotherThreadFromWritingTheFile) {
-    AssetIDDetails element;
-    element.setOwnerName("Anna");
-    agentEnvironment::forgetLog();
-    KO::_fileMutex.lock(withoutLimit);
-    std::atomic<bool> written{false};
-    std::thread other([&] {
-        element.flushAssetData();
-        written = true;
-    });
-    awaitEntry("flushAssetData");
-    EXPECT_FALSE(written);
-    EXPECT_EQ(file(), "");
-    KO::_fileMutex.unlock();
-    other.join();
-    EXPECT_TRUE(written);
-    EXPECT_EQ(valueOf(AssetIDDetails(), textGetters[2]), "Anna");
 }
 
 }  // namespace
