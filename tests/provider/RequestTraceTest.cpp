@@ -1,10 +1,4 @@
-#include "LeaseAndWarrantyProvider.h"
-#include "LeaseBase.h"
-#include "Support.h"
-#include "WarrantyBase.h"
-#include "broker/Broker.h"
-#include "broker/RequestScope.h"
-#include "model/ResultEvent.h"
+#include "RequestFixture.h"
 
 #include <gmock/gmock.h>
 
@@ -17,66 +11,10 @@ using namespace providerTest;
 using testing::Contains;
 using testing::ElementsAre;
 
-using KO::LeaseWarrantyProvider::LeaseBase;
-using KO::LeaseWarrantyProvider::LeaseUnit;
-using KO::LeaseWarrantyProvider::WarrantyBase;
-using KO::LeaseWarrantyProvider::WarrantyUnit;
-
 constexpr const char* entryFile = "LeaseAndWarrantyProvider.cpp";
 const std::string rule(78, '=');
 
-cimhost::NamedValue textKey(const std::string& name, const std::string& text) {
-    return {name, {CMPI_string, false, false, {text}}};
-}
-
-/** Requests as an object manager makes them, of which only what they log matters. */
-class RequestTrace : public CleanAgent {
-protected:
-    void SetUp() override {
-        CleanAgent::SetUp();
-        emptyTables();
-        instances = LeaseAndWarrantyProvider_Create_InstanceMI(broker.handle(), nullptr, nullptr);
-        associations = LeaseAndWarrantyProvider_Create_AssociationMI(broker.handle(), nullptr, nullptr);
-        agentEnvironment::forgetLog();
-    }
-
-    void TearDown() override {
-        emptyTables();
-        CleanAgent::TearDown();
-    }
-
-    static void emptyTables() {
-        LeaseBase::cache.table.clear();
-        LeaseBase::cache.recordCountLease = 0;
-        WarrantyBase::cache.table.clear();
-        WarrantyBase::cache.recordCountWarranty = 0;
-    }
-
-    void enumerate(const std::string& className) {
-        cimhost::RequestScope scope(broker);
-        instances->ft->enumerateInstances(instances, nullptr, scope.result(events),
-                                          scope.objectPath({"", "root/cimv2", className, {}}), nullptr);
-    }
-
-    void get(const std::string& className, std::vector<cimhost::NamedValue> keys) {
-        cimhost::RequestScope scope(broker);
-        instances->ft->getInstance(instances, nullptr, scope.result(events),
-                                   scope.objectPath({"", "root/cimv2", className, std::move(keys)}), nullptr);
-    }
-
-    void associate(const char* associationClass) {
-        cimhost::RequestScope scope(broker);
-        associations->ft->associatorNames(
-            associations, nullptr, scope.result(events),
-            scope.objectPath({"", "root/cimv2", "VELKO_ComputerSystem", {textKey("Name", "testhost")}}),
-            associationClass, nullptr, nullptr, nullptr);
-    }
-
-    cimhost::Broker broker{};
-    cimhost::ResultEvents events{};
-    CMPIInstanceMI* instances = nullptr;
-    CMPIAssociationMI* associations = nullptr;
-};
+using RequestTrace = RequestTest;
 
 TEST_F(RequestTrace, StandsBetweenTwoRules) {
     enumerate("VELKO_Lease");

@@ -218,6 +218,7 @@ TEST_P(CreateTest, TheCodeOfTheNamespaceStaysWhenNothingIsMade) {
     broker.failEvery(getNameSpace, CMPI_RC_ERR_ACCESS_DENIED);
     const Outcome outcome = createByKeys({});
     EXPECT_EQ(outcome.rc, CMPI_RC_ERR_ACCESS_DENIED);
+    EXPECT_FALSE(outcome.hasMessage);
     EXPECT_EQ(outcome.doneCount, 1);
     EXPECT_THAT(outcome.instances(), IsEmpty());
 }

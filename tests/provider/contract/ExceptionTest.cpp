@@ -9,14 +9,37 @@
 namespace contract {
 namespace {
 
+using testing::AllOf;
+using testing::Contains;
 using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
+using testing::Not;
 using testing::SizeIs;
 using testsupport::named;
 using testsupport::text;
 
 constexpr const char* thrownText = "the broker throws";
+
+/** A text whose characters throw, and who gives it: functions of tables know no other way to it. */
+CMPIString* throwingText = nullptr;
+
+CMPIString* giveThrowingText(const CMPIObjectPath*, CMPIStatus*) {
+    return throwingText;
+}
+
+/** What of a request's path throws. */
+struct ThrowingPart {
+    const char* name;
+    void (*alter)(CMPIObjectPathFT& table);
+};
+
+constexpr ThrowingPart throwingParts[] = {
+    {"class name", [](CMPIObjectPathFT& table) { throwFrom<std::runtime_error>(table.getClassName); }},
+    {"characters of the class name", [](CMPIObjectPathFT& table) { table.getClassName = &giveThrowingText; }},
+    {"namespace", [](CMPIObjectPathFT& table) { throwFrom<std::runtime_error>(table.getNameSpace); }},
+    {"characters of the namespace", [](CMPIObjectPathFT& table) { table.getNameSpace = &giveThrowingText; }},
+};
 
 class ExceptionTest : public RecordTest {
 protected:
@@ -72,6 +95,56 @@ protected:
         alter(altered.table);
         interface->ft->createInstance(interface, scope.context({}), altered.handle(),
                                       scope.objectPath(path(instanceId)), nullptr);
+    }
+
+    /** A request of the interfaces, and its name. */
+    struct Request {
+        const char* name;
+        std::function<CMPIStatus(const CMPIContext*, const CMPIResult*, const CMPIObjectPath*)> run;
+    };
+
+    /** Every request that is dispatched by class. */
+    std::vector<Request> dispatchedRequests() {
+        CMPIInstanceMI* mi = provider().instanceMI();
+        CMPIAssociationMI* ai = provider().associationMI();
+        const std::string setting = std::string(kind().className) + "Setting";
+        return {
+            {"names", [=](auto* c, auto* r, auto* p) { return mi->ft->enumerateInstanceNames(mi, c, r, p); }},
+            {"instances", [=](auto* c, auto* r, auto* p) { return mi->ft->enumerateInstances(mi, c, r, p, nullptr); }},
+            {"get", [=](auto* c, auto* r, auto* p) { return mi->ft->getInstance(mi, c, r, p, nullptr); }},
+            {"create", [=](auto* c, auto* r, auto* p) { return mi->ft->createInstance(mi, c, r, p, nullptr); }},
+            {"modify",
+             [=](auto* c, auto* r, auto* p) { return mi->ft->modifyInstance(mi, c, r, p, nullptr, nullptr); }},
+            {"delete", [=](auto* c, auto* r, auto* p) { return mi->ft->deleteInstance(mi, c, r, p); }},
+            {"associators",
+             [=](auto* c, auto* r, auto* p) {
+                 return ai->ft->associators(ai, c, r, p, setting.c_str(), nullptr, nullptr, nullptr, nullptr);
+             }},
+            {"associator names",
+             [=](auto* c, auto* r, auto* p) {
+                 return ai->ft->associatorNames(ai, c, r, p, setting.c_str(), nullptr, nullptr, nullptr);
+             }},
+        };
+    }
+
+    /** Makes a request with a path "A" of which one part throws. */
+    Outcome callWithThrowing(const ThrowingPart& part, const Request& request) {
+        return provider().call([&](auto& scope, const CMPIContext* context, const CMPIResult* result) {
+            Altered<CMPIString> text(broker.string("root/cimv2"));
+            throwFrom<std::runtime_error>(text.table.getCharPtr);
+            throwingText = text.handle();
+            Altered<CMPIObjectPath> altered(scope.objectPath(path("A")));
+            part.alter(altered.table);
+            return request.run(context, result, altered.handle());
+        });
+    }
+
+    static std::vector<std::string> functionsLogged() {
+        std::vector<std::string> functions;
+        for (const LogRecord& record : logOf()) {
+            functions.push_back(record.function);
+        }
+        return functions;
     }
 
     static void throwError(CMPIResultFT& table) { throwFrom<std::runtime_error>(table.returnInstance); }
@@ -164,6 +237,39 @@ TEST_P(ExceptionTest, ExceptionsFromTheRequestsPathAreCaught) {
     EXPECT_THAT(caughtFailures(), ElementsAre(thrownText));
 }
 
+TEST_P(ExceptionTest, ExceptionsFromClassNameAndNamespaceAreCaughtInEveryRequest) {
+    createAll({"A"});
+    for (const ThrowingPart& part : throwingParts) {
+        for (const Request& request : dispatchedRequests()) {
+            SCOPED_TRACE(std::string(part.name) + ", " + request.name);
+            agentEnvironment::forgetLog();
+            const Outcome outcome = callWithThrowing(part, request);
+            EXPECT_THAT(outcome, isOk(0));
+            EXPECT_THAT(outcome.events, IsEmpty());
+            EXPECT_THAT(caughtFailures(), ElementsAre(thrownText));
+            EXPECT_EQ(logOf().back().function, "markProviderExit");
+        }
+    }
+    EXPECT_THAT(identifiers(), ElementsAre("A"));
+    EXPECT_EQ(data(), dataOfNew({"A"}));
+}
+
+TEST_P(ExceptionTest, TheCodeThatANamespaceLeftBeforeItThrewIsTheAnswer) {
+    CMPIInstanceMI* interface = provider().instanceMI();
+    const Outcome outcome = provider().call([&](auto& scope, const CMPIContext* context, const CMPIResult* result) {
+        Altered<CMPIObjectPath> altered(scope.objectPath(path("A")));
+        throwingText = broker.string("a message");
+        altered.table.getNameSpace = [](const CMPIObjectPath*, CMPIStatus* status) -> CMPIString* {
+            *status = {CMPI_RC_ERR_ACCESS_DENIED, throwingText};
+            throw std::runtime_error(thrownText);
+        };
+        return interface->ft->createInstance(interface, context, result, altered.handle(), nullptr);
+    });
+    EXPECT_THAT(outcome, isRefused(CMPI_RC_ERR_ACCESS_DENIED));
+    EXPECT_THAT(caughtFailures(), ElementsAre(thrownText));
+    EXPECT_THAT(identifiers(), IsEmpty());
+}
+
 TEST_P(ExceptionTest, ValuesReadBeforeAnExceptionInAModificationAreWritten) {
     createAll({"A"});
     CMPIInstanceMI* interface = provider().instanceMI();
@@ -206,14 +312,15 @@ TEST_P(ExceptionTest, AFailingRewriteBehindAnExceptionIsLoggedAndTheFirstExcepti
     EXPECT_THAT(outcome, isOk(0));
     EXPECT_THAT(outcome.events, IsEmpty());
     EXPECT_THAT(caughtFailures(), ElementsAre(thrownText));
-    EXPECT_THAT(loggedFailures(), testing::Contains(kind().cannotOpen));
-    EXPECT_THAT(loggedFailures("trace"), testing::Contains(kind().cannotOpen));
+    EXPECT_THAT(loggedFailures(), Contains(kind().cannotOpen));
+    EXPECT_THAT(loggedFailures("trace"), Contains(kind().cannotOpen));
     EXPECT_THAT(identifiers(), ElementsAre("A"));
 }
 
 TEST_P(ExceptionTest, AnExceptionOfAnotherKindLeavesTheEntryPoint) {
     EXPECT_EQ(thrownNumber([&] { createDirectly("A", throwNumber); }), 42);
     EXPECT_THAT(loggedFailures(), IsEmpty());
+    EXPECT_THAT(functionsLogged(), AllOf(Contains("markProviderEntry"), Not(Contains("markProviderExit"))));
     EXPECT_EQ(data(), dataOfNew({"A"})) << "written while the exception leaves";
     EXPECT_THAT(identifiers(), ElementsAre("A")) << "the provider goes on";
     createAll({"B"});
@@ -223,7 +330,7 @@ TEST_P(ExceptionTest, AnExceptionOfAnotherKindLeavesTheEntryPoint) {
 TEST_P(ExceptionTest, AFailingRewriteBehindAnExceptionOfAnotherKindIsLoggedAndTheExceptionLeaves) {
     blockData(kind().dataFile);
     EXPECT_EQ(thrownNumber([&] { createDirectly("A", throwNumber); }), 42);
-    EXPECT_THAT(loggedFailures(), testing::Contains(kind().cannotOpen));
+    EXPECT_THAT(loggedFailures(), Contains(kind().cannotOpen));
     EXPECT_THAT(caughtFailures(), IsEmpty());
     EXPECT_THAT(identifiers(), ElementsAre("A"));
     freeData(kind().dataFile);

@@ -19,7 +19,7 @@ public:
     Altered(const Altered&) = delete;
     Altered& operator=(const Altered&) = delete;
 
-    const Handle* handle() const { return &object; }
+    Handle* handle() { return &object; }
 
     Table table;
 

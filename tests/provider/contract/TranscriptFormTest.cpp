@@ -1,4 +1,5 @@
 #include "TranscriptFixture.h"
+#include "support/Files.h"
 
 #include <algorithm>
 #include <map>
@@ -83,6 +84,57 @@ TEST_F(TranscriptPropertyTest, EachRequestStandsBetweenTwoRules) {
         }
         EXPECT_EQ(open, "") << "a request without end";
     });
+}
+
+/** How many lines the source file of the entry points has. */
+int linesOfEntryUnit() {
+    const std::string source = testsupport::readFile(ENTRY_UNIT_SOURCE);
+    return static_cast<int>(std::count(source.begin(), source.end(), '\n'));
+}
+
+TEST_F(TranscriptPropertyTest, MarkersTellTheLineOfTheEntryPoint) {
+    std::map<std::string, std::set<int>> linesOfEntryPoints;
+    forEachTranscript([&](const Scenario&, const std::vector<LogRecord>& records) {
+        int entryPointLine = 0;
+        for (const LogRecord& record : channel(records, "log")) {
+            const Line line = lineOf(record.text);
+            if (record.file == markerFile && line.kind == Line::entering) {
+                entryPointLine = line.line;
+                linesOfEntryPoints[line.name].insert(line.line);
+            } else if (record.file == markerFile && line.kind == Line::exiting) {
+                EXPECT_EQ(line.line, entryPointLine);
+            } else if (record.file == entryUnit && line.kind == Line::variable) {
+                EXPECT_GE(record.line, entryPointLine) << "the class id stands in the entry point";
+            }
+        }
+    });
+    std::set<int> all;
+    for (const auto& [entryPoint, lines] : linesOfEntryPoints) {
+        EXPECT_EQ(lines.size(), 1U) << entryPoint;
+        all.insert(lines.begin(), lines.end());
+    }
+    EXPECT_EQ(all.size(), 8U) << "one for each operation that is dispatched";
+    EXPECT_GT(*all.begin(), 0);
+    EXPECT_LE(*all.rbegin(), linesOfEntryUnit());
+}
+
+TEST_F(TranscriptPropertyTest, CaughtExceptionsAreToldByTheEntryPointAtALineOfItsFile) {
+    int caught = 0;
+    forEachTranscript([&](const Scenario&, const std::vector<LogRecord>& records) {
+        std::string entryPoint;
+        for (const LogRecord& record : channel(records, "log")) {
+            const Line line = lineOf(record.text);
+            if (record.file == markerFile && line.kind == Line::entering) {
+                entryPoint = line.name;
+            } else if (record.file == entryUnit && line.kind == Line::message) {
+                ++caught;
+                EXPECT_EQ(record.function, entryPoint);
+                EXPECT_GT(line.line, 0);
+                EXPECT_LE(line.line, linesOfEntryUnit());
+            }
+        }
+    });
+    EXPECT_GT(caught, 0);
 }
 
 TEST_F(TranscriptPropertyTest, MarkersAreFiledUnderTheTraceHeaderAndItsLines) {

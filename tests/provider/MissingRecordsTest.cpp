@@ -1,0 +1,68 @@
+// Requests of a store that counts records and has none.
+
+#include "RequestFixture.h"
+
+#include <gmock/gmock.h>
+
+namespace {
+
+using namespace providerTest;
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+constexpr const char* entryFile = "LeaseAndWarrantyProvider.cpp";
+
+/** A class of records, its count in the store, and what is thrown when that is not true. */
+struct CountedStore {
+    const char* className;
+    unsigned int& count;
+    const char* storeFile;
+    const char* cursor;
+    const char* noRecords;
+};
+
+class MissingRecords : public RequestTest {
+public:
+    using RequestTest::enumerate;
+    using RequestTest::enumerateNames;
+
+protected:
+    using Request = CMPIrc (MissingRecords::*)(const std::string&);
+
+    void expectOnlyLogged(const CountedStore& store, Request request, const char* entryPoint) {
+        SCOPED_TRACE(std::string(entryPoint) + " of " + store.className);
+        agentEnvironment::forgetLog();
+        store.count = 1;
+        EXPECT_EQ((this->*request)(store.className), CMPI_RC_OK);
+        store.count = 0;
+        EXPECT_THAT(events, IsEmpty()) << "nothing is returned, not even the end";
+        EXPECT_THAT(errorsOf(store.storeFile, store.cursor), ElementsAre(message(store.noRecords, store.storeFile)));
+        EXPECT_THAT(errorsOf(entryFile, entryPoint), ElementsAre(message(store.noRecords, entryFile)));
+        EXPECT_EQ(texts().back(), std::string(78, '='));
+    }
+
+    static std::vector<std::string> errorsOf(const std::string& file, const std::string& function) {
+        std::vector<std::string> errors;
+        for (const LogRecord& record : recordsOf(file, function)) {
+            if (record.level == 3000) {
+                errors.push_back(withoutLine(record.text));
+            }
+        }
+        return errors;
+    }
+};
+
+TEST_F(MissingRecords, EndEveryEnumerationAsASuccessWithoutResults) {
+    const CountedStore stores[] = {
+        {"VELKO_Lease", LeaseBase::cache.recordCountLease, "LeaseBase.cpp", "LeaseBase",
+         "Zero Lease Records Available"},
+        {"VELKO_Warranty", WarrantyBase::cache.recordCountWarranty, "WarrantyBase.cpp", "WarrantyBase",
+         "Zero Warranty Records Available"},
+    };
+    for (const CountedStore& store : stores) {
+        expectOnlyLogged(store, &MissingRecords::enumerate, "LeaseAndWarranty_EnumInstances");
+        expectOnlyLogged(store, &MissingRecords::enumerateNames, "LeaseAndWarranty_EnumInstanceNames");
+    }
+}
+
+}  // namespace
