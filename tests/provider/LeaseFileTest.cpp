@@ -2,11 +2,18 @@
 
 #include "Sides.h"
 
+#include <iterator>
+
 namespace {
 
 using namespace providerTest;
 
 using LeaseFile = RecordStore<LeaseSide>;
+
+/** The flags in file order, and the line of the first. */
+constexpr bool LeaseUnit::*flags[] = {&LeaseUnit::EarlyTerminationOption, &LeaseUnit::FixedPricePurchaseOption,
+                                      &LeaseUnit::RenewalOption, &LeaseUnit::BargainRenewalOption};
+constexpr std::size_t lineOfFirstFlag = 4;
 
 TEST_F(LeaseFile, StartsARecordWithFlagsClearedNumbersZeroAndTextsEmpty) {
     const LeaseUnit expected = [] {
@@ -57,17 +64,13 @@ TEST_F(LeaseFile, HoldsThirteenLinesInFileOrder) {
 }
 
 TEST_F(LeaseFile, HoldsEachFlagAsOneOrZero) {
-    constexpr std::pair<bool LeaseUnit::*, std::size_t> flags[] = {{&LeaseUnit::EarlyTerminationOption, 4},
-                                                                   {&LeaseUnit::FixedPricePurchaseOption, 5},
-                                                                   {&LeaseUnit::RenewalOption, 6},
-                                                                   {&LeaseUnit::BargainRenewalOption, 7}};
-    for (const auto& [member, line] : flags) {
+    for (std::size_t flag = 0; flag < std::size(flags); ++flag) {
         LeaseUnit unit("A");
-        unit.*member = true;
+        unit.*flags[flag] = true;
         std::vector<std::string> expected = linesOf(std::string("A\n") + LeaseSide::defaultRecord);
-        expected[line] = "1";
+        expected[lineOfFirstFlag + flag] = "1";
         EXPECT_EQ(linesOf(written(unit)), expected);
-        EXPECT_TRUE(reread(unit).*member);
+        EXPECT_TRUE(reread(unit).*flags[flag]);
     }
 }
 
@@ -83,34 +86,47 @@ std::string damaged(std::size_t line, const std::string& text) {
     return content + "B\nBee\n20250101000000.000000+000\n3\n0\n0\n0\n0\n21\n22\n23\n24\n4\n";
 }
 
-void expectStopped(const LeaseCache& cache, unsigned int leaseTerm, bool firstFlags) {
+/** That of a damaged record the term and this many flags were read, and nothing behind them; nor the second record. */
+void expectStopped(const LeaseCache& cache, unsigned int leaseTerm, std::size_t flagsRead) {
     ASSERT_EQ(cache.recordCountLease, 2U);
     ASSERT_EQ(cache.table.size(), 2U);
-    const LeaseUnit& first = cache.table[0];
-    EXPECT_EQ(first.InstanceID, "A");
-    EXPECT_EQ(first.Lessor, "Ay");
-    EXPECT_EQ(first.BaseTermCommencementDate, "20240101000000.000000+000");
-    EXPECT_EQ(first.LeaseTerm, leaseTerm);
-    EXPECT_EQ(first.EarlyTerminationOption, firstFlags);
-    EXPECT_EQ(first.FixedPricePurchaseOption, firstFlags);
-    EXPECT_FALSE(first.RenewalOption);
-    EXPECT_FALSE(first.BargainRenewalOption);
-    EXPECT_EQ(first.BaseRent, "");
-    EXPECT_EQ(first.NetMonthlyLeaseRateFactor, 0U);
-    EXPECT_EQ(LeaseSide::members(cache.table[1]), LeaseSide::members(first));
+    LeaseUnit expected("A");
+    expected.Lessor = "Ay";
+    expected.BaseTermCommencementDate = "20240101000000.000000+000";
+    expected.LeaseTerm = leaseTerm;
+    for (std::size_t flag = 0; flag < flagsRead; ++flag) {
+        expected.*flags[flag] = true;
+    }
+    for (const LeaseUnit& unit : cache.table) {
+        EXPECT_EQ(LeaseSide::members(unit), LeaseSide::members(expected));
+    }
 }
 
 TEST_F(LeaseFile, StopsReadingAtAWordInAFlagLine) {
-    for (const char* text : {"true", "x", "2", "-1", "*"}) {
-        SCOPED_TRACE(text);
-        expectStopped(*load(damaged(6, text)), 1, true);
+    for (std::size_t flag = 0; flag < std::size(flags); ++flag) {
+        for (const char* text : {"true", "x", "2", "-1", "*"}) {
+            SCOPED_TRACE(text);
+            expectStopped(*load(damaged(lineOfFirstFlag + flag, text)), 1, flag);
+        }
+    }
+}
+
+TEST_F(LeaseFile, TakesAFlagWithASignOrLeadingZeros) {
+    for (std::size_t flag = 0; flag < std::size(flags); ++flag) {
+        for (const auto& [text, value] : {std::pair("+1", true), std::pair("01", true), std::pair("+0", false),
+                                          std::pair("00", false), std::pair("-0", false)}) {
+            SCOPED_TRACE(text);
+            const auto cache = load(damaged(lineOfFirstFlag + flag, text));
+            EXPECT_EQ(cache->table.at(0).*flags[flag], value);
+            EXPECT_EQ(cache->table.at(1).InstanceID, "B") << "reading goes on";
+        }
     }
 }
 
 TEST_F(LeaseFile, StopsReadingAtWhatIsNoUnsignedNumber) {
     for (const char* text : {"x", "-5", "+5", "-0", "4294967296", ".5", "*"}) {
         SCOPED_TRACE(text);
-        expectStopped(*load(damaged(3, text)), 0, false);
+        expectStopped(*load(damaged(3, text)), 0, 0);
     }
 }
 

@@ -5,6 +5,7 @@
 #include <gmock/gmock.h>
 
 #include <locale>
+#include <type_traits>
 
 namespace {
 
@@ -39,6 +40,40 @@ TYPED_TEST_SUITE(Loading, Sides, SideNames);
 TYPED_TEST(Loading, OfAnAbsentFileGivesAnEmptyTableAndMakesNoFile) {
     typename TypeParam::Cache cache;
     this->expectEmpty(cache);
+    EXPECT_FALSE(std::filesystem::exists(this->path()));
+}
+
+/** Every way to a property, of which each throws this. */
+template <class Side>
+void expectNoProperty(typename Side::Base& base, const std::string& refusal) {
+    std::string text = "before";
+    unsigned int number = 7;
+    const auto expectRefused = [&](auto access) { EXPECT_EQ(thrown<InstrumentationException>(access), refusal); };
+    expectRefused([&] { base.getProperty(Side::Property::InstanceID, text); });
+    expectRefused([&] { base.getProperty(Side::text, text); });
+    expectRefused([&] { base.getProperty(Side::number, number); });
+    expectRefused([&] { base.setProperty(Side::text, text); });
+    expectRefused([&] { base.setProperty(Side::number, number); });
+    if constexpr (std::is_same_v<Side, LeaseSide>) {
+        bool flag = true;
+        expectRefused([&] { base.getProperty(Side::Property::RenewalOption, flag); });
+        expectRefused([&] { base.setProperty(Side::Property::RenewalOption, flag); });
+    }
+    EXPECT_EQ(text, "before");
+    EXPECT_EQ(number, 7U);
+}
+
+TYPED_TEST(Loading, OfNoFileLeavesCursorsAtTheEndWhereNoPropertyIsAvailable) {
+    typename TypeParam::Cache loaded;
+    this->expectEmpty(loaded);
+    this->table().swap(loaded.table);
+    this->count() = TypeParam::count(loaded);
+    {
+        typename TypeParam::Base base;
+        EXPECT_TRUE(this->atEnd(base));
+        EXPECT_FALSE(stands(base));
+        expectNoProperty<TypeParam>(base, std::string(TypeParam::name) + " record not available");
+    }
     EXPECT_FALSE(std::filesystem::exists(this->path()));
 }
 

@@ -172,6 +172,18 @@ TYPED_TEST(RecordCreation, DeletionLeavesTheCursorWhereItIs) {
     EXPECT_EQ(this->identifier(base), "B");
 }
 
+TYPED_TEST(RecordCreation, ARecordDeletedTwiceIsCountedDownOnce) {
+    this->fill({"A", "B", "C"});
+    {
+        typename TypeParam::Base base;
+        TypeParam::remove(base);
+        TypeParam::remove(base);
+        EXPECT_THAT(this->entries(), ElementsAre("|A", "B", "C"));
+        EXPECT_EQ(this->count(), 2U);
+    }
+    EXPECT_EQ(this->file(), std::string("2\nB\n") + TypeParam::defaultRecord + "C\n" + TypeParam::defaultRecord);
+}
+
 TYPED_TEST(RecordCreation, DeletionAtTheEndIsRefused) {
     this->fill({"A"});
     {

@@ -2,8 +2,6 @@
 
 #include "Sides.h"
 
-#include <gmock/gmock.h>
-
 namespace {
 
 using namespace providerTest;
@@ -27,10 +25,28 @@ TYPED_TEST(RecordFile, HoldsDefaultsForANewRecord) {
 TYPED_TEST(RecordFile, HoldsAsManyLinesForEveryRecordAsItHasFields) {
     typename TypeParam::Unit unit;
     EXPECT_EQ(linesOf(this->written(unit)).size(), TypeParam::linesOfRecord);
+    unit.InstanceID = "with blanks ";
+    unit.*TypeParam::date().member = "a date with blanks, not escaped";
     for (const auto& value : TypeParam::values()) {
-        unit.*value.member = "some text";
+        unit.*value.member = "some text ";
     }
     EXPECT_EQ(linesOf(this->written(unit)).size(), TypeParam::linesOfRecord);
+}
+
+TYPED_TEST(RecordFile, HoldsALineFeedInsideATextAsItIsWhichTakesAnotherLine) {
+    for (const auto& value : TypeParam::values()) {
+        typename TypeParam::Unit unit("A");
+        unit.*value.member = "two\nlines";
+        const auto lines = linesOf(this->written(unit));
+        ASSERT_EQ(lines.size(), TypeParam::linesOfRecord + 1);
+        EXPECT_EQ(lines[value.line], "two");
+        EXPECT_EQ(lines[value.line + 1], "lines");
+        EXPECT_EQ(this->reread(unit).*value.member, "two") << "the rest is taken for what follows";
+    }
+    const typename TypeParam::Unit unit("two\nlines");
+    EXPECT_EQ(linesOf(this->written(unit)).size(), TypeParam::linesOfRecord + 1);
+    EXPECT_EQ(this->reread(unit).InstanceID, "two");
+    EXPECT_EQ(this->reread(unit).*TypeParam::textMember, "lines");
 }
 
 TYPED_TEST(RecordFile, HoldsBlanksAsUnderscoresAndGivesThemBack) {
@@ -170,6 +186,28 @@ TYPED_TEST(RecordFile, ReadsARecordFromWhereTheStreamStands) {
     std::string next;
     stream >> next;
     EXPECT_EQ(next, "next");
+}
+
+TYPED_TEST(RecordFile, KeepsFieldsThatAreNotThereAsTheyWere) {
+    for (const char* text : {"before_reading", "*", "_", "plain", ""}) {
+        typename TypeParam::Unit before(text);
+        before.*TypeParam::date().member = text;
+        before.*TypeParam::numberMember = 7;
+        for (const auto& value : TypeParam::values()) {
+            before.*value.member = text;
+        }
+        auto expected = before;
+        for (const char* content : {"", "B_1\n", "B_1 Bee_Co"}) {
+            const std::string file = content;
+            write(this->path(), file);
+            std::ifstream stream(this->path());
+            auto unit = before;
+            stream >> unit;
+            expected.InstanceID = file.empty() ? text : "B 1";
+            expected.*TypeParam::textMember = file.find(' ') == std::string::npos ? text : "Bee Co";
+            EXPECT_EQ(TypeParam::members(unit), TypeParam::members(expected)) << text << " before " << content;
+        }
+    }
 }
 
 TYPED_TEST(RecordFile, KeepsInUseOfTheRecordReadInto) {

@@ -4,14 +4,12 @@
 
 #include <gmock/gmock.h>
 
+#include <algorithm>
 #include <stdexcept>
 
 namespace {
 
 using namespace providerTest;
-using testing::Contains;
-using testing::IsEmpty;
-using testing::SizeIs;
 
 template <class Side>
 class Rewrite : public RecordStore<Side> {
@@ -27,8 +25,14 @@ protected:
         return "1\nA\n" + record;
     }
 
-    /** How often the file was rewritten, or tried to be, since the log was forgotten. */
-    static std::size_t rewrites() { return textsOf(Words<Side>::sourceFile, "flushCache").size(); }
+    /** That the cursor's end told, at error level, that the file could not be rewritten. */
+    static void expectRewriteFailureTold() {
+        const auto records = recordsOf(Words<Side>::sourceFile, std::string("~") + Side::name + "Base");
+        const auto failure =
+            std::find_if(records.begin(), records.end(), [](const LogRecord& record) { return record.level == 3000; });
+        ASSERT_NE(failure, records.end());
+        EXPECT_EQ(withoutLine(failure->text), message(Words<Side>::cannotOpen, Words<Side>::sourceFile));
+    }
 };
 
 TYPED_TEST_SUITE(Rewrite, Sides, SideNames);
@@ -210,13 +214,53 @@ TYPED_TEST(Rewrite, ThatFailsWhileAnExceptionIsLeavingIsOnlyTold) {
                   throw std::runtime_error("the first one");
               }),
               "the first one");
-    const std::string destructor = std::string("~") + TypeParam::name + "Base";
-    const auto records = recordsOf(Words<TypeParam>::sourceFile, destructor);
-    const auto failure =
-        std::find_if(records.begin(), records.end(), [](const LogRecord& record) { return record.level == 3000; });
-    ASSERT_NE(failure, records.end());
-    EXPECT_EQ(withoutLine(failure->text), message(Words<TypeParam>::cannotOpen, Words<TypeParam>::sourceFile));
+    this->expectRewriteFailureTold();
     EXPECT_EQ(this->table().at(0).*TypeParam::textMember, "ACME");
+}
+
+/** Does something while an exception of somebody else's is leaving, as an object manager may call a provider. */
+template <class Action>
+void whileUnwinding(Action action) {
+    struct AtEnd {
+        Action& action;
+        ~AtEnd() { action(); }
+    };
+    try {
+        const AtEnd atEnd{action};
+        throw std::logic_error("the object manager's");
+    } catch (const std::logic_error& failure) {
+        EXPECT_STREQ(failure.what(), "the object manager's");
+    }
+}
+
+TYPED_TEST(Rewrite, ThatFailsForACursorMadeDuringUnwindingLeavesAsAnException) {
+    this->fill({"A"});
+    blockWithDirectory(this->path());
+    std::string failure;
+    whileUnwinding([&] {
+        failure = thrown<InstrumentationException>([&] {
+            typename TypeParam::Base base;
+            this->change(base, "ACME");
+        });
+    });
+    EXPECT_EQ(failure, Words<TypeParam>::cannotOpen);
+    EXPECT_EQ(this->table().at(0).*TypeParam::textMember, "ACME");
+}
+
+TYPED_TEST(Rewrite, ThatFailsBehindAnExceptionDuringUnwindingIsOnlyTold) {
+    this->fill({"A"});
+    blockWithDirectory(this->path());
+    agentEnvironment::forgetLog();
+    std::string failure;
+    whileUnwinding([&] {
+        failure = thrown<std::runtime_error>([&] {
+            typename TypeParam::Base base;
+            this->change(base, "ACME");
+            throw std::runtime_error("the first one");
+        });
+    });
+    EXPECT_EQ(failure, "the first one");
+    this->expectRewriteFailureTold();
 }
 
 TYPED_TEST(Rewrite, HappensWhileAnExceptionIsLeaving) {

@@ -9,7 +9,6 @@
 namespace {
 
 using namespace providerTest;
-using testing::Contains;
 using testing::ElementsAre;
 using testing::StartsWith;
 
@@ -186,6 +185,20 @@ TYPED_TEST(StoreTrace, TellsOfTheTableMadeAndReleased) {
     const std::string destructor = "~" + cache;
     EXPECT_THAT(this->told(destructor, [] { typename TypeParam::Cache made; }),
                 ElementsAre(entering(destructor, this->source()), exiting(destructor, this->source())));
+}
+
+TYPED_TEST(StoreTrace, TellsTheSameOfACountOfZeroAsOfNoFile) {
+    const auto loaded = [] {
+        agentEnvironment::forgetLog();
+        { typename TypeParam::Cache cache; }
+        return texts();
+    };
+    const auto withoutFile = loaded();
+    EXPECT_EQ(withoutFile.size(), 4U) << "making and release of the table, no record";
+    for (const char* content : {"0\n", "0", "0\nA\n"}) {
+        write(this->path(), content);
+        EXPECT_EQ(loaded(), withoutFile) << content;
+    }
 }
 
 TYPED_TEST(StoreTrace, IsTheSameOnBothChannels) {

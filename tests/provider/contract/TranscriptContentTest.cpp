@@ -137,6 +137,17 @@ TEST_F(TranscriptPropertyTest, AssociationsNoteTheMakingAndEndOfTheirParts) {
     });
 }
 
+TEST_F(TranscriptPropertyTest, ACountOfZeroIsLoadedLikeNoFile) {
+    const auto told = [&](const char* scenario) {
+        std::vector<std::string> texts;
+        for (const LogRecord& record : logged(scenario)) {
+            texts.push_back(std::to_string(record.level) + " " + record.function + " " + record.text);
+        }
+        return texts;
+    };
+    EXPECT_EQ(told("load-with-zero-counts"), told("load-without-files"));
+}
+
 TEST_F(TranscriptPropertyTest, OperationsThatAreOnlyNotedLeaveOneRecordEach) {
     EXPECT_THAT(
         namesOf("only-noted", Line::method, entryUnit),

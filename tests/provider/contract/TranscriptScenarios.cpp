@@ -261,6 +261,13 @@ std::vector<Scenario> ofTheLibrary() {
     };
     return {
         {"load-without-files", [](TranscriptTest& test) { test.provider(); }, false},
+        {"load-with-zero-counts",
+         [](TranscriptTest& test) {
+             test.writeData(leases.dataFile, recordFile(leases, {}));
+             test.writeData(warranties.dataFile, recordFile(warranties, {}));
+             test.provider();
+         },
+         false},
         {"load-with-records",
          [writeRecords](TranscriptTest& test) {
              writeRecords(test);
