@@ -8,7 +8,6 @@ namespace {
 
 using namespace providerTest;
 using testing::ElementsAre;
-using testing::IsEmpty;
 
 template <class Side>
 class RecordElement : public RecordStore<typename Side::Store> {
@@ -74,7 +73,7 @@ TYPED_TEST(RecordElement, StandsOnTheRecordOfTheFilterAndOnNoOther) {
 
 TYPED_TEST(RecordElement, ComparesTheFilterByteForByte) {
     this->fill({"L1", "L2 ", std::string("L2\0", 3), "L22", "L"});
-    for (const char* reference : {"l2", "L2", " L1", "L1 ", ""}) {
+    for (const char* reference : {"l1", "l2", "L2", " L1", "L1 ", ""}) {
         typename TypeParam::Element element;
         element.setFilter(TypeParam::Element::InstanceIDFilter, reference);
         EXPECT_FALSE(stands(element)) << reference;

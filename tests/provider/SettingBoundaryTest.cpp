@@ -1,5 +1,5 @@
-// What the framework throws in a moniker operation, and what of it may leave. The program's own
-// Moniker::getKeyCount takes the place of the framework's.
+// What the framework throws in a moniker operation, and what of it may leave; and keys that cannot be selected. The
+// program's own operations of Moniker that read keys take the place of the framework's.
 
 #include "SettingSides.h"
 
@@ -7,38 +7,77 @@
 #include <functional>
 #include <memory>
 #include <new>
+#include <optional>
+#include <set>
 #include <stdexcept>
 
 namespace {
 
-/** What the framework does in place of counting keys. */
-std::function<void()>& insteadOfCounting() {
-    static std::function<void()> action = [] {};
-    return action;
+using Key = std::pair<std::string, std::string>;
+
+/** What every moniker of the program is read as. */
+struct MonikerDouble {
+    std::function<void()> beforeCounting = [] {};
+    std::vector<Key> keys{};
+    std::optional<std::size_t> selected{};
+    std::set<unsigned int> unselectable{};
+};
+
+MonikerDouble& monikers() {
+    static MonikerDouble theDouble;
+    return theDouble;
+}
+
+/** Gives the selected key's name or value; without a selection there is none. */
+bool readSelected(std::string Key::*part, std::string& text) {
+    if (!monikers().selected) {
+        return false;
+    }
+    text = monikers().keys[*monikers().selected].*part;
+    return true;
 }
 
 }  // namespace
 
 unsigned int KO::Moniker::getKeyCount() const {
-    insteadOfCounting()();
-    return 0;
+    monikers().beforeCounting();
+    return static_cast<unsigned int>(monikers().keys.size());
+}
+
+bool KO::Moniker::selectKey(unsigned int index) {
+    if (monikers().unselectable.count(index) != 0) {
+        return false;
+    }
+    monikers().selected = index;
+    return true;
+}
+
+bool KO::Moniker::getName(std::string& name) const {
+    return readSelected(&Key::first, name);
+}
+
+bool KO::Moniker::getValue(std::string& value) const {
+    return readSelected(&Key::second, value);
 }
 
 namespace {
 
 using namespace providerTest;
 
+constexpr const char* noNameKey = "Could not find 'Name' Key in Moniker";
+constexpr const char* noInstanceIdKey = "Could not find 'InstanceID' Key in Moniker";
+
 template <class Side>
 class MonikerBoundary : public RecordStore<typename Side::Store> {
 protected:
     void TearDown() override {
-        insteadOfCounting() = [] {};
+        monikers() = {};
         RecordStore<typename Side::Store>::TearDown();
     }
 
     template <class Thrown>
     static void frameworkThrows(const Thrown& failure) {
-        insteadOfCounting() = [failure] { throw failure; };
+        monikers().beforeCounting = [failure] { throw failure; };
     }
 
     void toElement() { Side::elementMoniker(setting, argument); }
@@ -62,8 +101,8 @@ TYPED_TEST_SUITE(MonikerBoundary, SettingSides, SideNames);
 TYPED_TEST_SUITE(MonikerBoundaryDeathTest, SettingSides, SideNames);
 
 TYPED_TEST(MonikerBoundary, LetsTheElementsOwnFailuresOut) {
-    EXPECT_EQ(thrown<FrameworkException>([&] { this->toElement(); }), "Could not find 'Name' Key in Moniker");
-    EXPECT_EQ(thrown<FrameworkException>([&] { this->toComputer(); }), "Could not find 'InstanceID' Key in Moniker");
+    EXPECT_EQ(thrown<FrameworkException>([&] { this->toElement(); }), noNameKey);
+    EXPECT_EQ(thrown<FrameworkException>([&] { this->toComputer(); }), noInstanceIdKey);
 }
 
 TYPED_TEST(MonikerBoundary, LetsInstrumentationExceptionsOut) {
@@ -93,6 +132,29 @@ TYPED_TEST(MonikerBoundaryDeathTest, EndsTheProcessOnAStandardException) {
 TYPED_TEST(MonikerBoundaryDeathTest, EndsTheProcessOnWhatIsNoExceptionObject) {
     this->frameworkThrows(5);
     this->expectEnd();
+}
+
+TYPED_TEST(MonikerBoundary, PassesOverAKeyThatCannotBeSelected) {
+    monikers().keys = {{"Name", "nobody"}, {"Name", "testhost"}, {"InstanceID", "/nowhere"}, {"InstanceID", "/system"}};
+    monikers().selected = 0;
+    monikers().unselectable = {0, 2};
+    this->toElement();
+    EXPECT_EQ(textsOf(TypeParam::sourceFile, TypeParam::toElement).at(1),
+              variable("Name", "testhost", TypeParam::sourceFile));
+    monikers().selected = 2;
+    this->toComputer();
+    EXPECT_EQ(textsOf(TypeParam::sourceFile, "getComputerMoniker").at(1),
+              variable("Name", "testhost", TypeParam::sourceFile))
+        << "the name of the system";
+}
+
+TYPED_TEST(MonikerBoundary, DoesNotTakeTheKeySelectedBeforeForOneThatCannotBeSelected) {
+    monikers().keys = {{"Name", "testhost"}, {"InstanceID", "/system"}};
+    monikers().unselectable = {0, 1};
+    monikers().selected = 0;
+    EXPECT_EQ(thrown<FrameworkException>([&] { this->toElement(); }), noNameKey);
+    monikers().selected = 1;
+    EXPECT_EQ(thrown<FrameworkException>([&] { this->toComputer(); }), noInstanceIdKey);
 }
 
 }  // namespace

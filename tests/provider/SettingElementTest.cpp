@@ -2,8 +2,6 @@
 
 #include "SettingSides.h"
 
-#include <gmock/gmock.h>
-
 namespace {
 
 using namespace providerTest;
@@ -85,6 +83,28 @@ TYPED_TEST(SettingElement, SelectsAfreshInEachCall) {
     EXPECT_EQ(this->toElement({{"Name", "beta"}}), (Keys{{"InstanceID", "/system/second%5Fbox"}}));
     EXPECT_THROW(this->toComputer({{"InstanceID", "/nowhere"}}), InstrumentationException);
     EXPECT_EQ(this->toComputer({{"InstanceID", "/system/third"}}), (Keys{{"Name", "beta"}}));
+}
+
+TYPED_TEST(SettingElement, SelectsAfreshInEachCallWhateverRecordItsElementStandsOn) {
+    this->fill({"/system/first%20box", "unrelated", "/system/second%5Fbox"});
+    typename TypeParam::Setting fresh;
+    const auto toElement = [&](const char* name) {
+        Moniker argument = moniker({{"Name", name}});
+        return keysOf(TypeParam::elementMoniker(fresh, argument));
+    };
+    const auto toComputer = [&](const char* path) {
+        Moniker argument = moniker({{"InstanceID", path}});
+        return keysOf(fresh.getComputerMoniker(argument));
+    };
+    const Keys alpha = {{"InstanceID", "/system/first%20box"}};
+    const Keys beta = {{"InstanceID", "/system/second%5Fbox"}};
+    EXPECT_EQ(toElement("beta"), beta);
+    EXPECT_EQ(toElement("alpha"), alpha) << "the element stands behind its record";
+    EXPECT_EQ(toComputer("/system/third"), (Keys{{"Name", "beta"}}));
+    EXPECT_EQ(toElement("alpha"), alpha);
+    EXPECT_EQ(toElement("nobody"), (Keys{{"InstanceID", ""}}));
+    EXPECT_EQ(toElement("beta"), beta);
+    EXPECT_EQ(toComputer("/system/first%20box"), (Keys{{"Name", "alpha"}}));
 }
 
 TYPED_TEST(SettingElement, LeavesTheKeysOfItsArgumentAlone) {

@@ -164,6 +164,20 @@ TEST_P(AssociationEndsTest, AnElementWithKeysButNoIdentifierFails) {
     EXPECT_EQ(upCalls(), 0);
 }
 
+TEST_P(AssociationEndsTest, AnElementWhoseOnlyKeyIsNullFails) {
+    haveRecords({ofAlpha});
+    knowComputers({"alpha", "beta"});
+    const ObjectPath source =
+        objectPath(nameSpace, side().element, {named("InstanceID", testsupport::nullOf(CMPI_string))});
+    for (const Outcome& outcome : {associatorNames(source), associators(source)}) {
+        EXPECT_THAT(outcome, isOk(0));
+        EXPECT_THAT(outcome.events, IsEmpty());
+    }
+    EXPECT_THAT(caughtFailures(), ElementsAre("Could not find 'InstanceID' Key in Moniker",
+                                              "Could not find 'InstanceID' Key in Moniker"));
+    EXPECT_EQ(upCalls(), 0);
+}
+
 TEST_P(AssociationEndsTest, AnIdentifierThatIsNoPlaceInTheTreeFails) {
     haveRecords({"A"});
     knowComputers({"alpha", "beta"});

@@ -1,0 +1,83 @@
+// An element over a store whose records give no identifier.
+
+#include "ElementSides.h"
+#include "RecordElementImpl.h"
+
+// Not in an unnamed namespace: the instantiations below make all their operations, used or not.
+namespace providerTest {
+
+/** A store of one record that answers for no property that it has it. */
+class IdentifierlessBase {
+public:
+    enum class Property { InstanceID };
+
+    operator bool() { return true; }
+    void operator++() {}
+    bool create(const std::string&) { return true; }
+    void remove() {}
+    bool getProperty(Property, std::string&) const { return false; }
+};
+
+/** The words of an element, over that store. */
+template <class Element>
+struct Identifierless {
+    using Base = IdentifierlessBase;
+    static inline const KO::TraceUnit& unit = Element::unit;
+    static inline const KO::LeaseWarrantyProvider::RecordElementTexts& texts = Element::texts;
+};
+
+}  // namespace providerTest
+
+namespace KO::LeaseWarrantyProvider {
+
+template class RecordElement<providerTest::Identifierless<LeaseElement>>;
+template class RecordElement<providerTest::Identifierless<WarrantyElement>>;
+
+}  // namespace KO::LeaseWarrantyProvider
+
+namespace {
+
+using namespace providerTest;
+using KO::LeaseWarrantyProvider::LeaseElement;
+using KO::LeaseWarrantyProvider::RecordElement;
+using KO::LeaseWarrantyProvider::WarrantyElement;
+
+struct IdentifierlessLease {
+    using Element = RecordElement<Identifierless<LeaseElement>>;
+    static constexpr const char* sourceFile = "Lease.cpp";
+    static constexpr const char* refusal = "Could not find Instance ID property on Lease.";
+};
+
+struct IdentifierlessWarranty {
+    using Element = RecordElement<Identifierless<WarrantyElement>>;
+    static constexpr const char* sourceFile = "Warranty.cpp";
+    static constexpr const char* refusal = "Could not find Instance ID property on Warranty.";
+};
+
+template <class Side>
+class IdentifierlessElement : public CleanAgent {};
+
+using IdentifierlessSides = testing::Types<IdentifierlessLease, IdentifierlessWarranty>;
+TYPED_TEST_SUITE(IdentifierlessElement, IdentifierlessSides, SideNames);
+
+TYPED_TEST(IdentifierlessElement, CannotBeComparedWithAnIdentifier) {
+    typename TypeParam::Element element;
+    agentEnvironment::forgetLog();
+    EXPECT_EQ(thrown<InstrumentationException>([&] { element.setFilter(TypeParam::Element::InstanceIDFilter, "any"); }),
+              TypeParam::refusal);
+    EXPECT_EQ(thrown<InstrumentationException>([&] { element.evaluate(); }), TypeParam::refusal);
+    const auto records = recordsOf(TypeParam::sourceFile, "evaluate");
+    ASSERT_EQ(records.size(), 4U) << "twice an entry and no exit";
+    for (const std::size_t failed : {1U, 3U}) {
+        EXPECT_EQ(withoutLine(records[failed].text), message(TypeParam::refusal, TypeParam::sourceFile));
+        EXPECT_EQ(records[failed].level, 3000);
+    }
+}
+
+TYPED_TEST(IdentifierlessElement, PassesFiltersOfAnotherType) {
+    typename TypeParam::Element element;
+    element.setFilter(static_cast<typename TypeParam::Element::FilterType>(3), "any");
+    EXPECT_TRUE(element.evaluate());
+}
+
+}  // namespace
