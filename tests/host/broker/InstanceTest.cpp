@@ -179,6 +179,41 @@ TEST_F(KnownClassTest, AnInstanceStartsWithTheKeysOfItsPath) {
     EXPECT_EQ(instance->ft->getProperty(instance, "Name", nullptr).state, CMPI_keyValue);
 }
 
+TEST_F(KnownClassTest, AKeyStandsWhereItIsSet) {
+    CMPIInstance* instance = known();
+    const CMPIValue number = uint32Value(7);
+    instance->ft->setProperty(instance, "Other", &number, CMPI_uint32);
+    EXPECT_THAT(names(instance), testing::ElementsAre("Name", "Other"));
+    EXPECT_EQ(set(instance, "Name", "set").rc, CMPI_RC_OK);
+    EXPECT_THAT(names(instance), testing::ElementsAre("Other", "Name"));
+    const CMPIData key = instance->ft->getProperty(instance, "Name", &status);
+    EXPECT_EQ(characters(key.value.string), "set");
+    EXPECT_EQ(key.state, CMPI_keyValue);
+}
+
+TEST_F(KnownClassTest, AKeySetAgainStaysWhereItIs) {
+    CMPIInstance* instance = known();
+    const CMPIValue number = uint32Value(7);
+    set(instance, "Name", "first");
+    instance->ft->setProperty(instance, "Other", &number, CMPI_uint32);
+    set(instance, "Name", "second");
+    EXPECT_THAT(names(instance), testing::ElementsAre("Name", "Other"));
+    const CMPIData key = instance->ft->getProperty(instance, "Name", &status);
+    EXPECT_EQ(characters(key.value.string), "second");
+}
+
+TEST_F(KnownClassTest, AKeyOfACloneStandsWhereTheCloneSetsIt) {
+    CMPIInstance* original = known();
+    CMPIInstance* clone = original->ft->clone(original, &status);
+    ASSERT_NE(clone, nullptr);
+    const CMPIValue number = uint32Value(7);
+    clone->ft->setProperty(clone, "Other", &number, CMPI_uint32);
+    set(clone, "Name", "set");
+    EXPECT_THAT(names(clone), testing::ElementsAre("Other", "Name"));
+    EXPECT_THAT(names(original), testing::ElementsAre("Name"));
+    EXPECT_EQ(clone->ft->release(clone).rc, CMPI_RC_OK);
+}
+
 TEST_F(KnownClassTest, ChecksNamesAndTypes) {
     CMPIInstance* instance = known();
     const CMPIValue number = uint32Value(7);

@@ -32,6 +32,21 @@ TEST(RawOutput, ShowsTheStatusOfAFailureAndSaysItOnStandardErrorToo) {
     EXPECT_EQ(failed.error, "cimhost: error 2 (CMPI_RC_ERR_ACCESS_DENIED): as you\\nlike \"it\"\n");
 }
 
+TEST(RawOutput, ShowsACodeThatIsNoStatusCodeAsItIs) {
+    for (const char* code : {"256", "1000", "65535"}) {
+        const std::string shown = code + std::string(" (unknown code)");
+        const std::string path = std::string("Test_Answer.Code=") + code;
+        const Ended raw = run({"--raw", "gi", path});
+        EXPECT_EQ(raw.status, 1);
+        EXPECT_EQ(raw.output, "status: " + shown + "\nmessage: \"as you\\nlike \\\"it\\\"\"\nreturnDone: 0\n");
+        EXPECT_EQ(raw.error, "cimhost: error " + shown + ": as you\\nlike \"it\"\n");
+        const Ended asManager = run({"gi", path});
+        EXPECT_EQ(asManager.status, 1);
+        EXPECT_EQ(asManager.output, "");
+        EXPECT_EQ(asManager.error, raw.error);
+    }
+}
+
 TEST(RawOutput, TellsAnExceptionFromAMessage) {
     const Ended thrown = run({"--raw", "gi", "Test_Answer.Code=999"});
     EXPECT_EQ(thrown.status, 1);

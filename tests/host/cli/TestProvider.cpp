@@ -3,6 +3,7 @@
 
 #include <cmpift.h>
 
+#include <cstring>
 #include <stdexcept>
 #include <string>
 
@@ -10,8 +11,11 @@ namespace {
 
 const CMPIBroker* theBroker = nullptr;
 
+/** Also with a code that is no CMPIrc, which a provider written in C may answer. */
 CMPIStatus status(int code, const char* message = nullptr) {
-    CMPIStatus result{static_cast<CMPIrc>(code), nullptr};
+    CMPIStatus result{CMPI_RC_OK, nullptr};
+    static_assert(sizeof result.rc == sizeof code);
+    std::memcpy(&result.rc, &code, sizeof code);
     if (message != nullptr) {
         result.msg = theBroker->eft->newString(theBroker, message, nullptr);
     }
