@@ -7,17 +7,24 @@
 
 #include <gmock/gmock.h>
 
-#include <memory>
+#include <algorithm>
 #include <stdexcept>
 
 namespace {
 
 using namespace providerTest;
 using testing::Contains;
+using testing::ElementsAre;
 using testing::ElementsAreArray;
 using testing::Not;
 
 using Calls = std::vector<std::string>;
+
+constexpr const char* source = "AssetIDDetails.cpp";
+constexpr const char* lock = "lock 4294967295";
+constexpr const char* creationFailed = "Failed while opening Asset.dat in write mode";
+constexpr const char* readingFailed = "Throwing Exception in Constructor";
+constexpr const char* writingFailed = "Throwing Exception while writing Data";
 
 constexpr const char* const fixedReads[] = {
     "text USER.AssetNumber",     "text USER.AssetIdTag",    "text USER.Name",
@@ -25,11 +32,11 @@ constexpr const char* const fixedReads[] = {
     "date USER.LastInventoried", "date USER.PurchaseDate",  "text USER.Location",
     "text USER.ZOPMProfile",     "date USER.ZOPMUpdateTime"};
 
-const Calls creation = {"lock 4294967295",    "File asset.dat locked", "File::open 3 locked",
-                        "File::close locked", "~File locked",          "unlock locked"};
+const Calls creation = {lock,           "File asset.dat locked", "File::open 3 locked", "File::close locked",
+                        "~File locked", "unlock locked"};
 
 Calls reading() {
-    Calls calls = {"PropertyFile asset.dat", "lock 4294967295", "PropertyFile::open 1 locked"};
+    Calls calls = {"PropertyFile asset.dat", lock, "PropertyFile::open 1 locked"};
     for (const char* read : fixedReads) {
         calls.push_back(std::string("read ") + read + " locked");
     }
@@ -88,7 +95,7 @@ TEST_F(AssetCalls, WriteTheFileUnderTheLock) {
     const std::string none = std::string("=") + noDate + " locked";
     EXPECT_THAT(callsOf([&] { element.flushAssetData(); }),
                 ElementsAreArray(Calls{"PropertyFile asset.dat",
-                                       "lock 4294967295",
+                                       lock,
                                        "PropertyFile::open 3 locked",
                                        "write text USER.AssetNumber=A-1 locked",
                                        "write text USER.AssetIdTag= locked",
@@ -127,9 +134,10 @@ const std::function<void()> failures[] = {[] { throw KO::FrameworkException("no"
                                           [] { throw std::runtime_error("no"); }, [] { throw 5; }};
 
 TEST_F(AssetCalls, ThatFailInReadingLeaveNothingStoredAndTheLockFree) {
-    for (const char* call : {"PropertyFile asset.dat", "PropertyFile::open 1", "read text USER.AssetNumber",
-                             "read text USER.Phone", "read date USER.LastInventoried", "read text USER.ZOPMProfile",
-                             "read text USER.PersonalizedLabel1", "read text USER.PersonalizedData5"}) {
+    for (const char* call :
+         {"PropertyFile asset.dat", "PropertyFile::open 1", "read text USER.AssetNumber", "read text USER.Phone",
+          "read date USER.LastInventoried", "read text USER.ZOPMProfile", "read text USER.PersonalizedLabel1",
+          "read text USER.PersonalizedData5", "PropertyFile::close"}) {
         for (const auto& failure : failures) {
             SCOPED_TRACE(call);
             assetFileDouble::forget();
@@ -138,8 +146,7 @@ TEST_F(AssetCalls, ThatFailInReadingLeaveNothingStoredAndTheLockFree) {
             const AssetIDDetails element;
             expectNothingStored(element);
             EXPECT_FALSE(assetFileDouble::locked());
-            EXPECT_THAT(textsOf("AssetIDDetails.cpp", "AssetIDDetails"),
-                        Contains(message("Throwing Exception in Constructor", "AssetIDDetails.cpp")));
+            EXPECT_THAT(textsOf(source, "AssetIDDetails"), Contains(message(readingFailed, source)));
         }
     }
 }
@@ -149,6 +156,90 @@ TEST_F(AssetCalls, AfterAFailedReadAreNotMade) {
     const Calls calls = callsOf([] { AssetIDDetails(); });
     EXPECT_EQ(Calls(calls.end() - 3, calls.end()),
               (Calls{"read text USER.Phone locked", "unlock locked", "~PropertyFile"}));
+}
+
+/** Lets the lock fail where it is taken for the first time, or for the second, and so on. */
+void failLock(int number, const std::function<void()>& failure) {
+    assetFileDouble::before(lock, [number, failure, taken = 0]() mutable {
+        if (++taken == number) {
+            failure();
+        }
+    });
+}
+
+TEST_F(AssetCalls, ThatCannotLockForReadingReadNothing) {
+    for (const auto& failure : failures) {
+        assetFileDouble::forget();
+        agentEnvironment::forgetLog();
+        failLock(2, failure);
+        Calls expected = creation;
+        expected.insert(expected.end(), {"PropertyFile asset.dat", lock, "~PropertyFile"});
+        EXPECT_THAT(callsOf([] { expectNothingStored(AssetIDDetails()); }), ElementsAreArray(expected));
+        EXPECT_THAT(textsOf(source, "AssetIDDetails"), Contains(message(readingFailed, source)));
+    }
+}
+
+TEST_F(AssetCalls, ThatCannotLockForCreatingTheFileCreateNone) {
+    for (const auto& failure : failures) {
+        assetFileDouble::forget();
+        agentEnvironment::forgetLog();
+        failLock(1, failure);
+        const Calls calls = callsOf([] { AssetIDDetails(); });
+        EXPECT_EQ(calls.at(0), lock);
+        EXPECT_THAT(calls, Not(Contains(testing::StartsWith("File"))));
+        const auto records = recordsOf(source, "getFileName");
+        ASSERT_EQ(records.size(), 3U);
+        EXPECT_EQ(withoutLine(records[1].text), message(creationFailed, source));
+        EXPECT_EQ(records[1].level, 6000);
+        EXPECT_FALSE(assetFileDouble::locked());
+    }
+}
+
+/** Of each time that the lock is given back in an operation: whether this had been told before. */
+template <class Operation>
+std::vector<bool> toldWhenUnlocked(const char* function, const char* text, Operation operation) {
+    std::vector<bool> told;
+    agentEnvironment::forgetLog();
+    assetFileDouble::before("unlock", [&] {
+        const auto texts = textsOf(source, function);
+        told.push_back(std::find(texts.begin(), texts.end(), message(text, source)) != texts.end());
+    });
+    operation();
+    EXPECT_THAT(textsOf(source, function), Contains(message(text, source)));
+    assetFileDouble::before("unlock", [] {});
+    return told;
+}
+
+TEST_F(AssetCalls, ThatFailInReadingAreToldBeforeTheLockIsGivenBack) {
+    const auto make = [] { AssetIDDetails(); };
+    assetFileDouble::before("File::open 3", failures[0]);
+    EXPECT_THAT(toldWhenUnlocked("getFileName", creationFailed, make), ElementsAre(true, true));
+    assetFileDouble::forget();
+    assetFileDouble::before("read text USER.Phone", failures[0]);
+    EXPECT_THAT(toldWhenUnlocked("AssetIDDetails", readingFailed, make), ElementsAre(false, true))
+        << "the lock is first held for the file's creation";
+}
+
+TEST_F(AssetCalls, ThatFailInWritingAreToldAfterTheLockIsGivenBack) {
+    AssetIDDetails element;
+    assetFileDouble::before("PropertyFile::close", failures[0]);
+    EXPECT_THAT(toldWhenUnlocked("flushAssetData", writingFailed, [&] { element.flushAssetData(); }),
+                ElementsAre(false));
+}
+
+TEST_F(AssetCalls, ReadLabelAndDataOfAPairBeforeEitherIsTold) {
+    std::vector<std::size_t> toldBefore;
+    for (const char* number : {"1", "2", "3", "4", "5"}) {
+        assetFileDouble::before(std::string("read text USER.PersonalizedData") + number, [&] {
+            const auto texts = textsOf(source, "AssetIDDetails");
+            toldBefore.push_back(
+                static_cast<std::size_t>(std::count_if(texts.begin(), texts.end(), [](const std::string& text) {
+                    return text == variable("label", "Null", source) || text == variable("data", "Null", source);
+                })));
+        });
+    }
+    AssetIDDetails();
+    EXPECT_THAT(toldBefore, ElementsAre(0, 2, 4, 6, 8));
 }
 
 TEST_F(AssetCalls, KeepWhatWasReadBeforeAFailure) {
@@ -170,19 +261,17 @@ TEST_F(AssetCalls, ThatCannotCreateTheFileStillReadIt) {
             agentEnvironment::forgetLog();
             assetFileDouble::before(call, failure);
             EXPECT_TRUE(loaded(AssetIDDetails()));
-            const auto records = recordsOf("AssetIDDetails.cpp", "getFileName");
+            const auto records = recordsOf(source, "getFileName");
             ASSERT_EQ(records.size(), 3U);
-            EXPECT_EQ(withoutLine(records[1].text),
-                      message("Failed while opening Asset.dat in write mode", "AssetIDDetails.cpp"));
+            EXPECT_EQ(withoutLine(records[1].text), message(creationFailed, source));
             EXPECT_EQ(records[1].level, 6000);
         }
     }
 }
 
 TEST_F(AssetCalls, ThatFailInWritingAreOnlyToldAndLeaveTheLockFree) {
-    for (const char* call :
-         {"PropertyFile asset.dat", "lock 4294967295", "PropertyFile::open 3",
-          "write text USER.AssetNumber=", "write text USER.PersonalizedData5=Null", "PropertyFile::close"}) {
+    for (const char* call : {"PropertyFile asset.dat", lock, "PropertyFile::open 3", "write text USER.AssetNumber=",
+                             "write text USER.PersonalizedData5=Null", "PropertyFile::close"}) {
         for (const auto& failure : failures) {
             SCOPED_TRACE(call);
             assetFileDouble::forget();
@@ -191,8 +280,7 @@ TEST_F(AssetCalls, ThatFailInWritingAreOnlyToldAndLeaveTheLockFree) {
             agentEnvironment::forgetLog();
             element.flushAssetData();
             EXPECT_FALSE(assetFileDouble::locked());
-            EXPECT_THAT(textsOf("AssetIDDetails.cpp", "flushAssetData"),
-                        Contains(message("Throwing Exception while writing Data", "AssetIDDetails.cpp")));
+            EXPECT_THAT(textsOf(source, "flushAssetData"), Contains(message(writingFailed, source)));
         }
     }
 }

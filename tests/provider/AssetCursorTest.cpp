@@ -6,7 +6,10 @@
 #include <gmock/gmock.h>
 
 #include <cstdio>
+#include <cstdlib>
 #include <ctime>
+#include <optional>
+#include <utility>
 
 namespace {
 
@@ -190,6 +193,41 @@ std::time_t secondsOf(const std::string& text) {
     fields.tm_year -= 1900;
     fields.tm_mon -= 1;
     return timegm(&fields) - (sign == '-' ? -offset : offset) * 60;
+}
+
+/** Another time zone than that of the process, in the form of the variable TZ, while it lives. */
+class TimeZone {
+public:
+    explicit TimeZone(const char* zone) {
+        const char* present = std::getenv("TZ");
+        before = present == nullptr ? std::nullopt : std::optional<std::string>(present);
+        setenv("TZ", zone, 1);
+        tzset();
+    }
+    ~TimeZone() {
+        before ? setenv("TZ", before->c_str(), 1) : unsetenv("TZ");
+        tzset();
+    }
+    TimeZone(const TimeZone&) = delete;
+    TimeZone& operator=(const TimeZone&) = delete;
+
+private:
+    std::optional<std::string> before;
+};
+
+TEST_F(AssetCursor, TellsThePresentTimeInTheTimeZoneOfTheProcess) {
+    const AssetIDDetails element;
+    for (const auto& [zone, offset] :
+         {std::pair("EAST-5:30", "+330"), std::pair("WEST3", "-180"), std::pair("UTC0", "+000")}) {
+        const TimeZone here(zone);
+        const std::time_t before = std::time(nullptr);
+        const std::string text = element.getLocalDateTime();
+        const std::time_t after = std::time(nullptr);
+        ASSERT_EQ(text.size(), 25U);
+        EXPECT_EQ(text.substr(21), offset);
+        EXPECT_GE(secondsOf(text), before);
+        EXPECT_LE(secondsOf(text), after);
+    }
 }
 
 TEST_F(AssetCursor, TellsThePresentTime) {

@@ -1,3 +1,4 @@
+#include "AgentNodes.h"
 #include "ProviderFixture.h"
 #include "support/Files.h"
 
@@ -142,6 +143,14 @@ TEST_F(AgentIdentityTest, LetterCaseOfValuesCounts) {
     EXPECT_FALSE(isTheAgent({named("Vendor", text("vel"))}));
     EXPECT_FALSE(isTheAgent({named("Version", text("4.2.0 "))}));
     EXPECT_FALSE(isTheAgent({named("IdentifyingNumber", text("id-1"))}));
+}
+
+TEST_F(AgentIdentityTest, LetterCaseOfTheVersionCounts) {
+    const AgentVersion version("4.2.0-Beta");
+    EXPECT_TRUE(isTheAgent({named("Version", text("4.2.0-Beta"))}));
+    for (const char* other : {"4.2.0-beta", "4.2.0-BETA", "4.2.0-Beta ", "4.2.0"}) {
+        EXPECT_FALSE(isTheAgent({named("Version", text(other))})) << other;
+    }
 }
 
 TEST_F(AgentIdentityTest, LetterCaseOfKeyNamesDoesNotCount) {

@@ -12,18 +12,33 @@ namespace {
 /** The last line of the configuration before the nodes. */
 const std::string beforeNodes = "discover = false\n";
 
+/** What stands in the configuration before the characters of the version. */
+const std::string beforeVersion = "\nversion = \"";
+
 std::filesystem::path configuration() {
     return agentEnvironment::directory() / "agent.toml";
 }
 
 }  // namespace
 
-AgentNodes::AgentNodes(const std::string& nodes) : before(testsupport::readFile(configuration())) {
-    testsupport::writeFile(configuration(), before.substr(0, before.find(beforeNodes) + beforeNodes.size()) + nodes);
+AgentConfiguration::AgentConfiguration(const std::function<std::string(const std::string&)>& change)
+    : before(testsupport::readFile(configuration())) {
+    testsupport::writeFile(configuration(), change(before));
 }
 
-AgentNodes::~AgentNodes() {
+AgentConfiguration::~AgentConfiguration() {
     testsupport::writeFile(configuration(), before);
 }
+
+AgentNodes::AgentNodes(const std::string& nodes)
+    : AgentConfiguration([&](const std::string& usual) {
+          return usual.substr(0, usual.find(beforeNodes) + beforeNodes.size()) + nodes;
+      }) {}
+
+AgentVersion::AgentVersion(const std::string& version)
+    : AgentConfiguration([&](const std::string& usual) {
+          const std::size_t value = usual.find(beforeVersion) + beforeVersion.size();
+          return usual.substr(0, value) + version + usual.substr(usual.find('"', value));
+      }) {}
 
 }  // namespace contract

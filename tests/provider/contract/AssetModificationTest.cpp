@@ -1,4 +1,5 @@
 #include "AssetFixture.h"
+#include "ThrowingObjects.h"
 
 #include <filesystem>
 
@@ -221,6 +222,33 @@ TEST_F(AssetModificationTest, APathThatSelectsNothingWritesAllTheSame) {
     const ObjectPath other = path({named("Version", text("other"))});
     EXPECT_THAT(provider().modifyInstance(other, clientInstance(other, {named("AssetNumber", text("A-2"))})), isOk(0));
     EXPECT_EQ(stored("USER.AssetNumber"), "A-2");
+}
+
+TEST_F(AssetModificationTest, AFileThatCouldNotBeReadIsWrittenWithWhatWasSentAndEmptyTexts) {
+    blockData(assetFile);
+    CMPIInstanceMI* interface = provider().instanceMI();
+    static CMPIData (*original)(const CMPIInstance*, const char*, CMPIStatus*);
+    const Outcome outcome = provider().call([&](auto& scope, const CMPIContext* context, const CMPIResult* result) {
+        Altered<CMPIInstance> altered(scope.instance(
+            clientInstance(path(keys()), {named("AssetNumber", text("A-2")), named("PersonalizedData2", text("Room")),
+                                          named("PurchaseDate", dateTime("20250101000000.000000-300"))})));
+        original = altered.table.getProperty;
+        altered.table.getProperty = [](const CMPIInstance* instance, const char* name, CMPIStatus* status) {
+            freeData(assetFile);  // what could not be read when the request began can be written now
+            return original(instance, name, status);
+        };
+        return interface->ft->modifyInstance(interface, context, result, scope.objectPath(path(keys())),
+                                             altered.handle(), nullptr);
+    });
+    EXPECT_THAT(outcome, isOk(0));
+    EXPECT_EQ(stored("USER.AssetNumber"), "A-2");
+    EXPECT_EQ(stored("USER.PurchaseDate"), "20250101000000.000000-300");
+    EXPECT_THAT(storedPairs(), ElementsAre("|", "|Room", "|Room", "|Room", "|Room"));
+    for (const char* key : {"USER.AssetIdTag", "USER.Name", "USER.Phone", "USER.Position", "USER.Department",
+                            "USER.LastInventoried", "USER.Location", "USER.ZOPMProfile", "USER.ZOPMUpdateTime"}) {
+        EXPECT_EQ(stored(key), "") << key;
+    }
+    EXPECT_FALSE(isLogged(writingFailed));
 }
 
 TEST_F(AssetModificationTest, AFileThatCannotBeOpenedIsOnlyLogged) {

@@ -82,6 +82,18 @@ TEST_F(AssetNodesTest, AComputerWithoutProductHasNoProductName) {
     EXPECT_EQ(asset().properties.size(), 32U);
 }
 
+TEST_F(AssetNodesTest, AComputerWithoutProductAndWithoutAFileThatCanBeReadHasTheRest) {
+    blockData(assetFile);
+    haveNodes(system() + computer("\"108\" = \"testhost\""));
+    EXPECT_THAT(testsupport::namesOf(asset().properties),
+                ElementsAre("IdentifyingNumber", "Name", "Vendor", "Version", "Caption", "Description", "CSName",
+                            "AssetIDStringArea", "LocalDateTime"));
+    EXPECT_THAT(assetTexts(),
+                ElementsAre("IdentifyingNumber=\"/system\"", "Name=\"testhost\"", "Vendor=\"Example Maker\"",
+                            "Version=\"4.2.0\"", "Caption=\"Asset ID Information\"",
+                            "Description=\"Asset ID Information\"", "CSName=\"testhost\"", "AssetIDStringArea=1024"));
+}
+
 TEST_F(AssetNodesTest, AComputerWithoutNameShowsTheTextsBefore) {
     haveNodes(system() + computer("\"39\" = \"Model X - Tower\""));
     const Instance instance = asset();
