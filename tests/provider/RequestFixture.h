@@ -71,6 +71,14 @@ protected:
             .rc;
     }
 
+    CMPIrc create(const std::string& className, std::vector<cimhost::NamedValue> keys) {
+        cimhost::RequestScope scope(broker);
+        return instances->ft
+            ->createInstance(instances, nullptr, scope.result(events), pathOf(scope, className, std::move(keys)),
+                             nullptr)
+            .rc;
+    }
+
     CMPIrc associate(const char* associationClass) {
         cimhost::RequestScope scope(broker);
         return associations->ft

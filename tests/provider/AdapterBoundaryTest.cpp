@@ -1,0 +1,130 @@
+// What adapters make of a framework that fails, or that writes a value and says that there is none. The program's own
+// operations take the place of the framework's.
+
+#include "CMPIAssetIDDetail.h"
+#include "Exceptions.h"
+#include "KO/Instrumentation.h"
+#include "KO/ProviderUtilities.h"
+#include "RequestFixture.h"
+
+#include <gmock/gmock.h>
+
+#include <functional>
+
+namespace {
+
+/** What the framework does before it tells the computer's place, and how often it was asked. */
+struct ComputerDouble {
+    std::function<void()> before = [] {};
+    int asked = 0;
+};
+
+ComputerDouble& computer() {
+    static ComputerDouble theDouble;
+    return theDouble;
+}
+
+constexpr const char* onlyProperty = "SystemLocation";
+
+}  // namespace
+
+std::string KO::Instrumentation::getPathToComputer() {
+    ++computer().asked;
+    computer().before();
+    return "/system/computer";
+}
+
+/** Writes a value for every property, and says of one alone that the instance has it. */
+bool KO::ProviderUtilities::getProperty(const CMPIInstance*, const char* name, std::string& value, bool) {
+    value = std::string("written for ") + name;
+    return name == std::string(onlyProperty);
+}
+
+namespace {
+
+using namespace providerTest;
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+using KO::LeaseWarrantyProvider::AssetClass;
+using KO::LeaseWarrantyProvider::AssetIDDetails;
+
+class AssetModificationBoundary : public CleanAgent {};
+
+TEST_F(AssetModificationBoundary, TakesNoValueThatTheInstanceIsSaidNotToHave) {
+    write(agentEnvironment::dataDirectory() / "asset.dat",
+          "USER.AssetNumber=A-1\nUSER.Name=Ann\nUSER.PurchaseDate=20250101000000.000000+000\nUSER.Location=Hall\n");
+    AssetIDDetails details;
+    const CMPIInstance instance{};
+    AssetClass::modify(details, &instance);
+    const AssetIDDetails reread;
+    std::string text;
+    EXPECT_TRUE(reread.getAssetNumber(text));
+    EXPECT_EQ(text, "A-1");
+    EXPECT_TRUE(reread.getPrimaryOwnerName(text));
+    EXPECT_EQ(text, "Ann");
+    EXPECT_TRUE(reread.getPurchaseDate(text));
+    EXPECT_EQ(text, "20250101000000.000000+000");
+    EXPECT_TRUE(reread.getSystemLocation(text));
+    EXPECT_EQ(text, "written for SystemLocation");
+    std::vector<AssetIDDetails::PersonalizedPair> pairs;
+    EXPECT_TRUE(details.getPersonalizedData(pairs));
+    EXPECT_EQ(pairs, (std::vector<AssetIDDetails::PersonalizedPair>(5)));
+}
+
+/** The two classes whose records clients create. */
+class CreationBoundary : public RequestTest {
+protected:
+    void SetUp() override {
+        RequestTest::SetUp();
+        computer() = {};
+    }
+    void TearDown() override {
+        computer() = {};
+        RequestTest::TearDown();
+    }
+
+    static void expectNothingMade() {
+        EXPECT_THAT(LeaseBase::cache.table, IsEmpty());
+        EXPECT_THAT(WarrantyBase::cache.table, IsEmpty());
+        EXPECT_TRUE(std::filesystem::is_empty(agentEnvironment::dataDirectory()));
+    }
+
+    static constexpr const char* classNames[] = {"VELKO_Lease", "VELKO_Warranty"};
+};
+
+TEST_F(CreationBoundary, AsksForTheComputersPlaceOnce) {
+    for (const char* className : classNames) {
+        computer().asked = 0;
+        EXPECT_EQ(create(className, {textKey("InstanceID", "A")}), CMPI_RC_OK);
+        EXPECT_EQ(computer().asked, 1) << className;
+    }
+    EXPECT_EQ(LeaseBase::cache.table.size(), 1U);
+    EXPECT_EQ(WarrantyBase::cache.table.size(), 1U);
+}
+
+TEST_F(CreationBoundary, AsksForTheComputersPlaceAlsoWithoutAKey) {
+    for (const char* className : classNames) {
+        computer().asked = 0;
+        EXPECT_EQ(create(className, {}), CMPI_RC_OK);
+        EXPECT_EQ(computer().asked, 1) << className;
+        EXPECT_THAT(events, ElementsAre(testing::VariantWith<cimhost::Done>(testing::_)));
+        events.clear();
+    }
+    expectNothingMade();
+}
+
+TEST_F(CreationBoundary, MakesNothingWhenTheComputersPlaceCannotBeTold) {
+    computer().before = [] { throw KO::InstrumentationException("no tree"); };
+    for (const char* className : classNames) {
+        EXPECT_EQ(create(className, {textKey("InstanceID", "A")}), CMPI_RC_OK);
+        EXPECT_THAT(events, IsEmpty());
+    }
+    const std::string file = "LeaseAndWarrantyProvider.cpp";
+    EXPECT_THAT(textsOf(file, "LeaseAndWarranty_CreateInstance"),
+                ElementsAre(variable("classId", "20", file), message("no tree", file), variable("classId", "21", file),
+                            message("no tree", file)));
+    expectNothingMade();
+}
+
+}  // namespace

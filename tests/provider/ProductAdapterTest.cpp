@@ -1,0 +1,71 @@
+// The adapters of the agent and of the asset identification, made for a namespace alone.
+
+#include "CMPIAssetIDDetail.h"
+#include "CMPIOstrelAgent.h"
+#include "KO/ProviderUtilities.h"
+#include "Support.h"
+#include "broker/Broker.h"
+#include "broker/RequestScope.h"
+
+#include <gmock/gmock.h>
+
+namespace {
+
+using namespace providerTest;
+using testing::Each;
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+using KO::ProviderUtilities;
+using KO::LeaseWarrantyProvider::CMPIAssetIDDetail;
+using KO::LeaseWarrantyProvider::CMPIOstrelAgent;
+
+class ProductAdapter : public CleanAgent {
+protected:
+    /** The values of a key, and the namespaces, of the paths that an adapter walks over. */
+    struct Walked {
+        std::vector<std::string> keys{};
+        std::vector<std::string> nameSpaces{};
+        std::size_t instances = 0;
+    };
+
+    template <class Adapter>
+    Walked walked(const char* key) {
+        Adapter adapter(broker.handle(), nullptr, std::string("root/elsewhere"));
+        Walked found;
+        for (; adapter; ++adapter) {
+            std::string value = "(none)";
+            const CMPIObjectPath* path = adapter.getObjectPath();
+            ProviderUtilities::getKeyProperty(path, key, value);
+            found.keys.push_back(value);
+            found.nameSpaces.push_back(ProviderUtilities::getNamespace(path));
+            found.instances += adapter.getCMPIInstance(nullptr) == nullptr ? 0U : 1U;
+        }
+        return found;
+    }
+
+    cimhost::Broker broker{};
+    cimhost::RequestScope scope{broker};
+};
+
+TEST_F(ProductAdapter, OfANamespaceIsTheAgentWithoutACheckOfKeys) {
+    const Walked found = walked<CMPIOstrelAgent>("Name");
+    EXPECT_THAT(found.keys, ElementsAre("Test Agent"));
+    EXPECT_THAT(found.nameSpaces, Each("root/elsewhere"));
+    EXPECT_EQ(found.instances, 1U);
+    EXPECT_THAT(textsOf("OstrelAgent.cpp", "setFilter"), IsEmpty());
+    EXPECT_THAT(textsOf("CMPIOstrelAgent.cpp", "setObjectPath"), IsEmpty());
+}
+
+TEST_F(ProductAdapter, OfANamespaceHasAnInstanceOfTheAssetDataForEveryComputer) {
+    const Walked found = walked<CMPIAssetIDDetail>("Name");
+    EXPECT_THAT(found.keys, ElementsAre("spaced", "tight", "dashless", "dash first", "dash second", "many dashes",
+                                        "empty", "productless", "/system%20one"))
+        << "the last has no name: the key before it is shown";
+    EXPECT_THAT(found.nameSpaces, Each("root/elsewhere"));
+    EXPECT_EQ(found.instances, 9U);
+    EXPECT_THAT(textsOf("AssetIDDetails.cpp", "setFilter"), IsEmpty());
+    EXPECT_THAT(textsOf("CMPIAssetIDDetail.cpp", "setObjectPath"), IsEmpty());
+}
+
+}  // namespace
