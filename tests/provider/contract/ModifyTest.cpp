@@ -252,6 +252,25 @@ TEST_F(ProviderTest, EveryModifiablePropertyOfALeaseIsWritten) {
     EXPECT_EQ(shown(provider().getInstance(path).instances().at(0).properties), expected);
 }
 
+TEST_F(ProviderTest, AWarrantysDateAndDurationAreStoredFromAModificationThatAlsoSendsACaption) {
+    const ObjectPath path = keyedPath("VELKO_Warranty", "W");
+    provider().createInstance(path, clientInstance(path, {}));
+    EXPECT_THAT(provider().modifyInstance(
+                    path, clientInstance(path, {named("WarrantyStartDate", dateTime(date)),
+                                                named("WarrantyDuration", uint32(24)), named("Caption", text("new"))})),
+                isOk(0));
+    EXPECT_EQ(readData("Warranty.dat"), "1\nW\n*\n20240506070809.123456+120\n24\n");
+    for (const bool isLoadedAgain : {false, true}) {
+        if (isLoadedAgain) {
+            unload();
+        }
+        EXPECT_THAT(
+            shown(provider().getInstance(path).instances().at(0).properties),
+            ElementsAre("InstanceID=\"W\"", "ElementName=\"Warranty Information\"",
+                        std::string("WarrantyStartDate=\"") + date + '"', "WarrantyDuration=24", "Warrantor=\"\""));
+    }
+}
+
 TEST_F(ProviderTest, EveryModifiablePropertyOfAWarrantyIsWritten) {
     const ObjectPath path = keyedPath("VELKO_Warranty", "W 1");
     provider().createInstance(path, clientInstance(path, {}));

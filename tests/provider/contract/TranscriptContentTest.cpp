@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <map>
+#include <regex>
 #include <set>
 
 // What stands in transcripts: levels, loggers, and the records that tell scenarios apart.
@@ -106,6 +107,40 @@ TEST_F(TranscriptPropertyTest, OnlyLeasesTellOfTheirCreation) {
             EXPECT_EQ(line.value, "1");
         }
     });
+}
+
+/** The property list that a parameter list tells of, as its address; "0" for none. Empty when it tells of none. */
+std::string propertyListIn(const std::string& parameters) {
+    static const std::regex list(".* properties=?(0x[0-9a-f]+|0)( .*)?");
+    std::smatch part;
+    return std::regex_match(parameters, part, list) ? part[1].str() : std::string();
+}
+
+TEST_F(TranscriptPropertyTest, APropertyListIsToldWhereverItIsHandedOn) {
+    const auto toldBy = [&](const std::string& scenario) {
+        std::vector<std::string> functions;
+        for (const LogRecord& record : logged(scenario)) {
+            const Line line = lineOf(record.text);
+            const std::string list = propertyListIn(line.value);
+            if (line.kind == Line::entering && !list.empty() && list != "0") {
+                functions.push_back(record.file + " " + record.function);
+            }
+        }
+        return functions;
+    };
+    for (const std::string side : {"Lease", "Warranty"}) {
+        const std::string adapter = "CMPI" + side + ".cpp ";
+        const std::string setting = "CMPI" + side + "Setting.cpp ";
+        EXPECT_THAT(toldBy(side + "-get"), IsEmpty());
+        EXPECT_THAT(toldBy(side + "-get-listed"), ElementsAre(adapter + "getCMPIInstance"));
+        EXPECT_THAT(toldBy(side + "-modify-listed"), ElementsAre(adapter + "modifyCMPIInstance"));
+        EXPECT_THAT(toldBy(side + "Setting-enumerate-listed"),
+                    ElementsAre(setting + "getCMPIInstance", setting + "getCMPIInstance"));
+        EXPECT_THAT(toldBy(side + "Setting-from-computer-listed"),
+                    ElementsAre(setting + "getAssociator", adapter + "getCMPIInstance"));
+        EXPECT_THAT(toldBy(side + "Setting-from-element-listed"),
+                    ElementsAre(setting + "getAssociator", "CMPIComputerSystem.cpp getCMPIInstance"));
+    }
 }
 
 TEST_F(TranscriptPropertyTest, AssociationsNoteTheMakingAndEndOfTheirParts) {

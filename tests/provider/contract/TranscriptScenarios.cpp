@@ -76,10 +76,14 @@ void create(Library& provider, const ObjectPath& path) {
     provider.createInstance(path, clientInstance(path, {}));
 }
 
-void modify(Library& provider, const Side& side, const std::string& identifier) {
+void modify(Library& provider, const Side& side, const std::string& identifier,
+            const cimhost::PropertyList& properties = {}) {
     const ObjectPath path = keyedPath(side.element, identifier);
-    provider.modifyInstance(path, changed(path, changesOf(side)));
+    provider.modifyInstance(path, changed(path, changesOf(side)), properties);
 }
+
+/** A property list, which is traced and never applied. */
+const cimhost::PropertyList oneProperty(std::vector<std::string>{"Caption"});
 
 std::vector<Scenario> ofRecords(const Side& side) {
     const std::string prefix = std::string(side.element).substr(6) + "-";
@@ -89,6 +93,7 @@ std::vector<Scenario> ofRecords(const Side& side) {
         with("enumerate-names", enumerateNames),
         with("enumerate", enumerate),
         with("get", [](Library& p, const Side& s) { p.getInstance(keyedPath(s.element, "A")); }),
+        with("get-listed", [](Library& p, const Side& s) { p.getInstance(keyedPath(s.element, "A"), oneProperty); }),
         with("get-absent", [](Library& p, const Side& s) { p.getInstance(keyedPath(s.element, "B")); }),
         with("create", [](Library& p, const Side& s) { create(p, keyedPath(s.element, "B")); }),
         {prefix + "create-first", [side](TranscriptTest& test) { create(test.begin(), keyedPath(side.element, "B")); }},
@@ -96,6 +101,7 @@ std::vector<Scenario> ofRecords(const Side& side) {
         with("create-without-key", [](Library& p, const Side& s) { create(p, classPath(s.element)); }),
         unwritable(side, "create", [](Library& p, const Side& s) { create(p, keyedPath(s.element, "B")); }),
         with("modify", [](Library& p, const Side& s) { modify(p, s, "A"); }),
+        with("modify-listed", [](Library& p, const Side& s) { modify(p, s, "A", oneProperty); }),
         with("modify-absent", [](Library& p, const Side& s) { modify(p, s, "B"); }),
         with("delete", [](Library& p, const Side& s) { p.deleteInstance(keyedPath(s.element, "A")); }),
         with("delete-absent", [](Library& p, const Side& s) { p.deleteInstance(keyedPath(s.element, "B")); }),
@@ -122,8 +128,9 @@ std::function<void(Library&, const Side&)> namesFrom(std::function<ObjectPath(co
     return [source](Library& provider, const Side& side) { provider.associatorNames(source(side), through(side)); };
 }
 
-std::function<void(Library&, const Side&)> instancesFrom(std::function<ObjectPath(const Side&)> source) {
-    return [source](Library& provider, const Side& side) { provider.associators(source(side), through(side)); };
+std::function<void(Library&, const Side&)> instancesFrom(std::function<ObjectPath(const Side&)> source,
+                                                         const cimhost::PropertyList& properties = {}) {
+    return [=](Library& provider, const Side& side) { provider.associators(source(side), through(side), properties); };
 }
 
 ObjectPath theComputer(const Side&) {
@@ -147,6 +154,8 @@ std::vector<Scenario> ofAssociations(const Side& side) {
     return {
         of("enumerate-names", {"testhost"}, list),
         of("enumerate", {"testhost"}, listInstances),
+        of("enumerate-listed", {"testhost"},
+           [](Library& p, const Side& s) { p.enumerateInstances(classPath(s.association), oneProperty); }),
         of("enumerate-names-two-computers", {"testhost", "second"}, list),
         of("enumerate-names-no-computer", {}, list),
         of("get", {"testhost"},
@@ -157,12 +166,14 @@ std::vector<Scenario> ofAssociations(const Side& side) {
            }),
         of("names-from-computer", {"testhost"}, namesFrom(theComputer)),
         of("from-computer", {"testhost"}, instancesFrom(theComputer)),
+        of("from-computer-listed", {"testhost"}, instancesFrom(theComputer, oneProperty)),
         of("names-from-unknown-computer", {"testhost"}, namesFrom([](const Side&) { return computerPath("other"); })),
         of("names-from-computer-class", {"testhost"},
            namesFrom([](const Side&) { return classPath("VELKO_ComputerSystem"); })),
         of("names-from-computer-without-name", {"testhost"}, namesFrom(computerWithoutName)),
         of("names-from-element", {"testhost", "second"}, namesFrom(theElement)),
         of("from-element", {"testhost", "second"}, instancesFrom(theElement)),
+        of("from-element-listed", {"testhost", "second"}, instancesFrom(theElement, oneProperty)),
         of("names-from-element-one-computer", {"testhost"}, namesFrom(theElement)),
         of("names-from-element-no-computer", {}, namesFrom(theElement)),
         of("names-from-element-without-place", {"testhost", "second"},
