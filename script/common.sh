@@ -105,7 +105,7 @@ for test in json.load(sys.stdin)["tests"]:
 for number, (command, name) in enumerate(sorted(programs.items()), 1):
     words = " ".join(f"[==[{word}]==]" for word in [*wrapper, *command])
     print(f"add_test({name}.{number} {words})")
-    print(f"set_tests_properties({name}.{number} PROPERTIES TIMEOUT 900)")
+    print(f"set_tests_properties({name}.{number} PROPERTIES TIMEOUT 3600)")
 ' "/build/$preset/" "$@" >"$directory/CTestTestfile.cmake"
     ctest --test-dir "$directory" --parallel "$(nproc)" --output-on-failure --no-tests=error
 }

@@ -4,6 +4,8 @@
 
 #include <gtest/gtest.h>
 
+#include <ostream>
+
 #include <algorithm>
 #include <string>
 #include <utility>
@@ -19,6 +21,11 @@ struct KindRow {
     const char* plain;
     const char* withList;
 };
+
+/** As its number; GoogleTest would print the bytes, those between the members too. */
+void PrintTo(const KindRow& row, std::ostream* stream) {
+    *stream << row.kind;
+}
 
 class TraceKind : public testing::TestWithParam<KindRow> {};
 
