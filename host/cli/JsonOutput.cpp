@@ -2,7 +2,7 @@
 
 #include <nlohmann/json.hpp>
 
-#include "cli/StatusText.h"
+#include "operations/StatusText.h"
 #include "schema/CimType.h"
 #include "schema/ObjectPathText.h"
 #include "schema/Text.h"

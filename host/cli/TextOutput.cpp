@@ -2,8 +2,8 @@
 
 #include <algorithm>
 
-#include "cli/StatusText.h"
 #include "cli/Words.h"
+#include "operations/StatusText.h"
 #include "schema/CimType.h"
 #include "schema/MofWriter.h"
 #include "schema/ObjectPathText.h"

@@ -6,8 +6,8 @@
 
 #include "cli/Commands.h"
 #include "cli/ExitStatus.h"
-#include "cli/StatusText.h"
 #include "operations/LibraryError.h"
+#include "operations/StatusText.h"
 #include "schema/Errors.h"
 
 namespace {

@@ -1,4 +1,4 @@
-#include "cli/StatusText.h"
+#include "operations/StatusText.h"
 
 #include "schema/Text.h"
 
