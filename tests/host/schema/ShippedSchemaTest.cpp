@@ -4,13 +4,11 @@
 
 #include "host/schema/Schemas.h"
 #include "schema/CimType.h"
-#include "schema/Registration.h"
 
 namespace cimhost::test {
 namespace {
 
 using testing::ElementsAre;
-using testing::UnorderedElementsAre;
 using testing::UnorderedElementsAreArray;
 
 const std::filesystem::path directory = SCHEMA_DIRECTORY;
@@ -124,33 +122,6 @@ TEST(ShippedSchema, TheFilesLoadInTheOrderOfTheirNamesToo) {
         reader.readFile(file);
     }
     EXPECT_EQ(schema.classes().size(), classNames.size());
-}
-
-TEST(ShippedRegistration, NamesOneProviderForEachServedClass) {
-    std::vector<std::string> classes;
-    const Schema schema = shipped();
-    for (const ProviderRegistration& stanza : readRegistrationFile(directory / "LeaseAndWarrantyProvider.reg")) {
-        classes.push_back(stanza.className);
-        EXPECT_EQ(stanza.provider, "LeaseAndWarrantyProvider");
-        EXPECT_EQ(stanza.location, "LeaseAndWarrantyProvider");
-        EXPECT_TRUE(stanza.instance);
-        EXPECT_EQ(stanza.association, schema.findClass(stanza.className)->isAssociation()) << stanza.className;
-        EXPECT_THAT(stanza.nameSpaces, ElementsAre("root/cimv2"));
-        EXPECT_EQ(stanza.group, "LeaseAndWarranty");
-        EXPECT_EQ(stanza.unload, "never");
-    }
-    EXPECT_THAT(classes, UnorderedElementsAre("VELKO_Lease", "VELKO_Warranty", "VELKO_LeaseSetting",
-                                              "VELKO_WarrantySetting", "VELKO_OstrelAgent", "VELKO_AssetIDDetails"));
-}
-
-TEST(ShippedRegistration, NamesAProviderOfItsOwnForComputers) {
-    const auto stanzas = readRegistrationFile(directory / "ComputerSystemProvider.reg");
-    ASSERT_EQ(stanzas.size(), 1U);
-    EXPECT_EQ(stanzas[0].className, "VELKO_ComputerSystem");
-    EXPECT_EQ(stanzas[0].provider, "ComputerSystemProvider");
-    EXPECT_EQ(stanzas[0].location, "ComputerSystemProvider");
-    EXPECT_TRUE(stanzas[0].instance);
-    EXPECT_FALSE(stanzas[0].association);
 }
 
 }  // namespace
