@@ -153,6 +153,10 @@ std::vector<const Made*> referencesBy(const Request& request, const AssociationF
     return answers;
 }
 
+const CMPIInstance* elementOf(const Provider& provider, const Way& way, const Link& link) {
+    return provider.get(namingPath(link.element, *findClass(way.far->referenceClass)));
+}
+
 }  // namespace
 
 void associatorNames(const Request& request, const AssociationFilter& filter) {
@@ -167,7 +171,7 @@ void associators(const Request& request, const AssociationFilter& filter, const 
     std::vector<const CMPIInstance*> answers;
     const PropertyList list(properties);
     follow(request, filter, [&](const Way& way, const Link& link, const Provider& provider) {
-        const CMPIInstance* instance = isComputerEnd(*way.far) ? link.computer : provider.get(link.element);
+        const CMPIInstance* instance = isComputerEnd(*way.far) ? link.computer : elementOf(provider, way, link);
         const Class* farClass = findClass(way.far->referenceClass);
         if (instance != nullptr) {
             answers.push_back(list.applied(request.broker, instance, *farClass));

@@ -1,7 +1,8 @@
 #include "Changes.h"
 
 #include "Calls.h"
-#include "Objects.h"
+
+#include <algorithm>
 
 namespace gate {
 
@@ -9,6 +10,9 @@ namespace {
 
 /** Goes on by itself: what a client sends back is always of yesterday. */
 constexpr const char* movingProperty = "LocalDateTime";
+
+/** How the provider knows that there is no date. */
+constexpr const char* noDate = "00000000000000.000000-000";
 
 /** Refuses names that the class does not have. */
 void requireKnownProperties(const Class& owner, const CMPIInstance* instance) {
@@ -55,21 +59,30 @@ Values changesTo(const CMPIInstance* current, const Values& given) {
     return changes;
 }
 
-CMPIInstance* changed(const CMPIBroker* broker, const CMPIObjectPath* path, const Class& owner,
-                      const CMPIInstance* current, const Values& changes) {
-    CMPIInstance* instance = makeInstance(broker, path);
+Values changed(const Class& owner, const CMPIInstance* current, const Values& changes) {
+    Values values = changes;
     for (const Property& property : owner) {
-        if (!property.isWritable) {
+        const auto isIt = [&](const auto& change) { return change.first == &property; };
+        if (!property.isWritable || std::any_of(changes.begin(), changes.end(), isIt)) {
             continue;
         }
-        if (const auto text = propertyOf(current, property)) {
-            setProperty(broker, instance, property, *text);
+        const auto text = propertyOf(current, property);
+        if (text) {
+            values.emplace_back(&property, *text);
+        } else if (property.type != CMPI_dateTime) {
+            // Everything but a date has a value: without it, the provider cannot have read its file.
+            fail(CMPI_RC_ERR_FAILED, std::string(property.name) + " cannot be read, so nothing is changed.");
         }
     }
-    for (const auto& [property, text] : changes) {
-        setProperty(broker, instance, *property, text);
+    return values;
+}
+
+Values undoing(const Values& changes, const CMPIInstance* current) {
+    Values values;
+    for (const auto& change : changes) {
+        values.emplace_back(change.first, propertyOf(current, *change.first).value_or(noDate));
     }
-    return instance;
+    return values;
 }
 
 void requireChanged(const CMPIInstance* before, const CMPIInstance* after, const Values& changes) {

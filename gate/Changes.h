@@ -18,11 +18,13 @@ Values givenValues(const Class& owner, const CMPIInstance* instance, const Prope
 Values changesTo(const CMPIInstance* current, const Values& given);
 
 /**
- * What the provider is given to make changes: an instance with every writable value that the current one has, and the
- * changes over them. A provider that is told only a part of them may take the rest from somewhere else.
+ * What the provider is given to make changes: every writable value that the current instance has, and the changes over
+ * them. A provider that is told only a part of them may take the rest from somewhere else.
  */
-CMPIInstance* changed(const CMPIBroker* broker, const CMPIObjectPath* path, const Class& owner,
-                      const CMPIInstance* current, const Values& changes);
+Values changed(const Class& owner, const CMPIInstance* current, const Values& changes);
+
+/** What takes changes back: the values that the current instance, read before them, has in their place. */
+Values undoing(const Values& changes, const CMPIInstance* current);
 
 /** Fails unless the instance, read again after a change, has the changes. */
 void requireChanged(const CMPIInstance* before, const CMPIInstance* after, const Values& changes);

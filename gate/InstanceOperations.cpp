@@ -29,7 +29,7 @@ void requireInstance(const CMPIInstance* instance) {
     }
 }
 
-const CMPIInstance* existing(const Provider& provider, const CMPIObjectPath* path, const Class& owner) {
+const CMPIInstance* existing(const Provider& provider, const OwnPath& path, const Class& owner) {
     const CMPIInstance* instance = provider.get(path);
     if (instance == nullptr) {
         fail(CMPI_RC_ERR_NOT_FOUND, std::string("There is no such ") + owner.name + ".");
@@ -37,38 +37,31 @@ const CMPIInstance* existing(const Provider& provider, const CMPIObjectPath* pat
     return instance;
 }
 
-/** A record, as it is named. */
-struct Record {
+/** An instance that is to be changed, as it is named. */
+struct Target {
     const Class& owner;
     const DataFile& file;
-    std::string identifier;
-    const CMPIObjectPath* path;
+    OwnPath path;
+
+    const std::string& identifier() const { return path.key(identifierKey); }
 
     void requireStored() const {
-        if (file.keepsRecords() && file.recordsOf(identifier) == 0) {
-            fail(CMPI_RC_ERR_FAILED, std::string(file.fileName) + " does not hold " + identifier + ".");
+        if (file.keepsRecords() && file.recordsOf(identifier()) == 0) {
+            fail(CMPI_RC_ERR_FAILED, std::string(file.fileName) + " does not hold " + identifier() + ".");
         }
     }
 };
 
-Record recordOf(const CMPIObjectPath* path, const Class& owner, const DataFile& file) {
-    const Property* key = findProperty(owner, identifierKey);
-    return {owner, file, key == nullptr ? std::string() : keyOf(path, *key).value_or(std::string()), path};
-}
-
 /** Makes the changes; when they cannot be stored, the provider is given the old values back. */
-void apply(const Request& request, const Provider& provider, const Record& record, const CMPIInstance* current,
-           const Values& changes) {
-    const auto changedBy = [&](const Values& values) {
-        return changed(request.broker, record.path, record.owner, current, values);
-    };
-    const CMPIInstance* undone = changedBy({});
+void apply(const Provider& provider, const Target& target, const CMPIInstance* current, const Values& changes) {
+    const OwnInstance wanted(changed(target.owner, current, changes));
+    const OwnInstance undone(changed(target.owner, current, undoing(changes, current)));
     try {
-        provider.modify(record.path, changedBy(changes));
-        requireChanged(current, existing(provider, record.path, record.owner), changes);
-        record.requireStored();
-    } catch (const Failure&) {
-        provider.modify(record.path, undone);
+        provider.modify(target.path, wanted);
+        requireChanged(current, existing(provider, target.path, target.owner), changes);
+        target.requireStored();
+    } catch (...) {
+        provider.modify(target.path, undone);
         throw;
     }
 }
@@ -89,30 +82,31 @@ std::string identifierFor(const CMPIObjectPath* path, const CMPIInstance* instan
     return named.empty() ? given : named;
 }
 
-void fillNew(const Request& request, const Provider& provider, const Record& record, const Values& given) {
-    const CMPIInstance* current = existing(provider, record.path, record.owner);
+void fillNew(const Provider& provider, const Target& target, const Values& given) {
+    const CMPIInstance* current = existing(provider, target.path, target.owner);
     const Values changes = changesTo(current, given);
-    record.requireStored();
+    target.requireStored();
     if (!changes.empty()) {
-        apply(request, provider, record, current, changes);
+        apply(provider, target, current, changes);
     }
 }
 
-/** Makes the record with its values, or none at all. */
-void create(const Request& request, const Provider& provider, const Record& record, const CMPIInstance* instance,
-            const Values& given) {
-    if (provider.get(record.path) != nullptr) {
+/** Makes the record with its values and answers its path, or makes none at all. */
+void create(const Request& request, const Provider& provider, const Target& target, const Values& given) {
+    if (provider.get(target.path) != nullptr) {
         fail(CMPI_RC_ERR_ALREADY_EXISTS,
-             std::string("There is a ") + record.owner.name + " " + record.identifier + " already.");
+             std::string("There is a ") + target.owner.name + " " + target.identifier() + " already.");
     }
-    record.file.requireWritable();
+    target.file.requireWritable();
+    CMPIObjectPath* answer = makePath(request.broker, nameSpaceOf(request.path), target.owner.name);
+    addKey(answer, identifierKey, target.identifier());
     try {
-        provider.create(record.path, instance);
-        fillNew(request, provider, record, given);
-    } catch (const Failure&) {
-        if (provider.get(record.path) != nullptr) {
-            provider.remove(record.path);
-        }
+        provider.create(target.path);
+        fillNew(provider, target, given);
+        request.give(answer);
+        request.finish();
+    } catch (...) {
+        provider.remove(target.path);
         throw;
     }
 }
@@ -124,7 +118,7 @@ void enumerateInstanceNames(const Request& request) {
     if (requested.isAssociation) {
         return enumerateAssociationNames(request, requested);
     }
-    const CMPIObjectPath* classPath = makePath(request.broker, nameSpaceOf(request.path), requested.name);
+    const OwnPath classPath(nameSpaceOf(request.path), requested.name);
     const Provider::Paths paths = Provider(request.context).names(classPath);
     for (const CMPIObjectPath* path : paths) {
         request.give(path);
@@ -137,7 +131,7 @@ void enumerateInstances(const Request& request, const char** properties) {
     if (requested.isAssociation) {
         return enumerateAssociations(request, requested);
     }
-    const CMPIObjectPath* classPath = makePath(request.broker, nameSpaceOf(request.path), requested.name);
+    const OwnPath classPath(nameSpaceOf(request.path), requested.name);
     const PropertyList list(properties);
     const Provider::Instances instances = Provider(request.context).instances(classPath);
     for (const CMPIInstance* instance : instances) {
@@ -151,7 +145,7 @@ void getInstance(const Request& request, const char** properties) {
     if (requested.isAssociation) {
         return getAssociation(request, requested);
     }
-    const CMPIObjectPath* path = namingPath(request.broker, request.path, requested);
+    const OwnPath path = namingPath(request.path, requested);
     const CMPIInstance* instance = existing(Provider(request.context), path, requested);
     request.give(PropertyList(properties).applied(request.broker, instance, requested));
     request.finish();
@@ -165,15 +159,9 @@ void createInstance(const Request& request, const CMPIInstance* instance) {
     const Values given = givenValues(requested, instance, PropertyList(nullptr));
     requireKept(file, *findProperty(requested, identifierKey), identifier);
     requireKept(file, given);
-    const auto newPath = [&] {
-        CMPIObjectPath* path = makePath(request.broker, nameSpaceOf(request.path), requested.name);
-        addKey(path, identifierKey, identifier);
-        return path;
-    };
-    const CMPIObjectPath* answer = newPath();
-    create(request, Provider(request.context), {requested, file, identifier, newPath()}, instance, given);
-    request.give(answer);
-    request.finish();
+    OwnPath path(nameSpaceOf(request.path), requested.name);
+    path.addKey(identifierKey, identifier);
+    create(request, Provider(request.context), {requested, file, std::move(path)}, given);
 }
 
 void modifyInstance(const Request& request, const CMPIInstance* instance, const char** properties) {
@@ -182,31 +170,31 @@ void modifyInstance(const Request& request, const CMPIInstance* instance, const 
     requireInstance(instance);
     const PropertyList list(properties);
     list.requireKnown(requested);
-    const Record record = recordOf(namingPath(request.broker, request.path, requested), requested, file);
+    const Target target{requested, file, namingPath(request.path, requested)};
     const Values given = givenValues(requested, instance, list);
     const Provider provider(request.context);
-    const CMPIInstance* current = existing(provider, record.path, requested);
+    const CMPIInstance* current = existing(provider, target.path, requested);
     const Values changes = changesTo(current, given);
     requireKept(file, changes);
     if (!changes.empty()) {
         file.requireWritable();
-        apply(request, provider, record, current, changes);
+        apply(provider, target, current, changes);
     }
 }
 
 void deleteInstance(const Request& request) {
     const Class& requested = request.requestedClass();
     const DataFile& file = fileOf(requested, true);
-    const Record record = recordOf(namingPath(request.broker, request.path, requested), requested, file);
+    const Target target{requested, file, namingPath(request.path, requested)};
     const Provider provider(request.context);
-    existing(provider, record.path, requested);
+    existing(provider, target.path, requested);
     file.requireWritable();
-    const std::size_t before = file.recordsBefore(record.identifier);
-    provider.remove(record.path);
-    const std::size_t after = file.recordsOf(record.identifier);
-    if (provider.get(record.path) != nullptr || (after != 0 && after >= before)) {
-        fail(CMPI_RC_ERR_FAILED, std::string(requested.name) + " " + record.identifier +
-                                     " could not be deleted for good: " + file.fileName + " still holds it.");
+    const std::size_t before = file.recordsBefore(target.identifier());
+    provider.remove(target.path);
+    const std::size_t after = file.recordsOf(target.identifier());
+    if (after != 0 && after >= before) {
+        fail(CMPI_RC_ERR_FAILED, std::string(requested.name) + " " + target.identifier() +
+                                     " is deleted for now only: " + file.fileName + " still holds it.");
     }
 }
 

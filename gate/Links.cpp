@@ -62,7 +62,8 @@ std::vector<Computer> knownComputers(const Request& request) {
 std::vector<Link> linksOf(const Provider& provider, const std::vector<Computer>& computers, const Class& association) {
     std::vector<Link> links;
     for (const Computer& computer : computers) {
-        for (const CMPIObjectPath* element : provider.associatorNames(computer.path, association.name)) {
+        const OwnPath path = namingPath(computer.path, *findClass(computerClass));
+        for (const CMPIObjectPath* element : provider.associatorNames(path, association.name)) {
             links.push_back({computer.path, computer.instance, element});
         }
     }

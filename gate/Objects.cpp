@@ -45,18 +45,18 @@ CMPIInstance* makeInstance(const CMPIBroker* broker, const CMPIObjectPath* path)
     return instance;
 }
 
-CMPIObjectPath* namingPath(const CMPIBroker* broker, const CMPIObjectPath* path, const Class& named) {
-    CMPIObjectPath* made = makePath(broker, nameSpaceOf(path), named.name);
+OwnPath namingPath(const CMPIObjectPath* path, const Class& named) {
+    OwnPath made(nameSpaceOf(path), named.name);
     for (const Property& property : named) {
         if (!property.isKey) {
             continue;
         }
-        const auto text = keyOf(path, property);
+        auto text = keyOf(path, property);
         if (!text) {
             fail(CMPI_RC_ERR_INVALID_PARAMETER,
                  std::string("The path of a ") + named.name + " needs the key " + property.name + " as a string.");
         }
-        addKey(made, property.name, *text);
+        made.addKey(property.name, std::move(*text));
     }
     return made;
 }

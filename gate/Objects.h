@@ -1,6 +1,6 @@
 #pragma once
 
-#include "Schema.h"
+#include "OwnObjects.h"
 
 #include <cmpift.h>
 
@@ -20,10 +20,10 @@ CMPIObjectPath* makePath(const CMPIBroker* broker, const std::string& nameSpace,
 CMPIInstance* makeInstance(const CMPIBroker* broker, const CMPIObjectPath* path);
 
 /**
- * The path as the gate hands it on: of the class as the MOF writes it, with the class's keys and no others.
+ * The path as the provider is given it: of the class as the MOF writes it, with the class's keys and no others.
  * CMPI_RC_ERR_INVALID_PARAMETER when one of them is not there: such a path names no instance.
  */
-CMPIObjectPath* namingPath(const CMPIBroker* broker, const CMPIObjectPath* path, const Class& named);
+OwnPath namingPath(const CMPIObjectPath* path, const Class& named);
 
 /** The path of an instance. */
 const CMPIObjectPath* pathOf(const CMPIInstance* instance);

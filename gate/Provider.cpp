@@ -1,8 +1,10 @@
 #include "Provider.h"
 
 #include "Calls.h"
+#include "Objects.h"
 #include "WrappedBroker.h"
 
+#include <algorithm>
 #include <optional>
 
 extern "C" {
@@ -31,20 +33,26 @@ void requireOk(const CMPIStatus& status) {
     fail(status.rc, reason.empty() ? "The provider answers code " + std::to_string(status.rc) + "." : reason);
 }
 
-/** Looks at what the provider passes over in silence: exceptions, and answers that could not be made. */
-void requireWhole(const CapturedResult& result) {
+/** Calls a function of one of the provider's interfaces that answers into the result. */
+template <auto function, class Interface, class... Arguments>
+void call(CapturedResult& result, Interface* interface, const CMPIContext* context, Arguments... arguments) {
+    connection.broker->forgetFailures();
+    requireOk((interface->ft->*function)(interface, context, &result.handle, arguments...));
+    // The provider leaves out what it cannot make.
     require(!connection.broker->hasFailed(), "make the paths and instances of the answer");
+}
+
+void requireDone(const CapturedResult& result) {
     if (!result.isDone) {
         fail(CMPI_RC_ERR_FAILED, "The provider broke off its answer. The agent's log, level 3000, says why.");
     }
 }
 
-/** Calls a function of one of the provider's interfaces that answers into the result. */
+/** The same for an answer that has to be ended. */
 template <auto function, class Interface, class... Arguments>
 void answer(CapturedResult& result, Interface* interface, const CMPIContext* context, Arguments... arguments) {
-    connection.broker->forgetFailures();
-    requireOk((interface->ft->*function)(interface, context, &result.handle, arguments...));
-    requireWhole(result);
+    call<function>(result, interface, context, arguments...);
+    requireDone(result);
 }
 
 }  // namespace
@@ -61,50 +69,62 @@ bool Provider::connect(const CMPIBroker* manager) {
     return connection.instances != nullptr && connection.associations != nullptr;
 }
 
-Provider::Paths Provider::names(const CMPIObjectPath* classPath) const {
+Provider::Paths Provider::names(const OwnPath& classPath) const {
     CapturedResult result;
-    answer<&CMPIInstanceMIFT::enumerateInstanceNames>(result, connection.instances, context, classPath);
+    answer<&CMPIInstanceMIFT::enumerateInstanceNames>(result, connection.instances, context, classPath.handle());
     return result.paths;
 }
 
-Provider::Instances Provider::instances(const CMPIObjectPath* classPath) const {
+Provider::Instances Provider::instances(const OwnPath& classPath) const {
     CapturedResult result;
     const char** const all = nullptr;
-    answer<&CMPIInstanceMIFT::enumerateInstances>(result, connection.instances, context, classPath, all);
+    answer<&CMPIInstanceMIFT::enumerateInstances>(result, connection.instances, context, classPath.handle(), all);
     return result.instances;
 }
 
-const CMPIInstance* Provider::get(const CMPIObjectPath* path) const {
+const CMPIInstance* Provider::get(const OwnPath& path) const {
     CapturedResult result;
     const char** const all = nullptr;
-    answer<&CMPIInstanceMIFT::getInstance>(result, connection.instances, context, path, all);
+    call<&CMPIInstanceMIFT::getInstance>(result, connection.instances, context, path.handle(), all);
+    if (result.instances.empty() && !result.isDone && isListed(path)) {
+        requireDone(result);
+    }
     return result.instances.empty() ? nullptr : result.instances.front();
 }
 
-void Provider::create(const CMPIObjectPath* path, const CMPIInstance* instance) const {
+/** The provider breaks off as well where there is just no such instance: then the class's names do not have it. */
+bool Provider::isListed(const OwnPath& path) const {
+    const CMPIObjectPath* wanted = path.handle();
+    const Paths listed = names(OwnPath(nameSpaceOf(wanted), classNameOf(wanted)));
+    return std::any_of(listed.begin(), listed.end(), [&](const auto* each) { return samePath(each, wanted); });
+}
+
+void Provider::create(const OwnPath& path) const {
     CapturedResult result;
-    answer<&CMPIInstanceMIFT::createInstance>(result, connection.instances, context, path, instance);
+    const OwnInstance notLookedAt{{}};
+    answer<&CMPIInstanceMIFT::createInstance>(result, connection.instances, context, path.handle(),
+                                              notLookedAt.handle());
 }
 
 // Changes end no answer, not even a good one: who makes one has to look whether it was made.
 
-void Provider::modify(const CMPIObjectPath* path, const CMPIInstance* instance) const {
+void Provider::modify(const OwnPath& path, const OwnInstance& instance) const {
     CapturedResult result;
     CMPIInstanceMI* mi = connection.instances;
-    requireOk(mi->ft->modifyInstance(mi, context, &result.handle, path, instance, nullptr));
+    requireOk(mi->ft->modifyInstance(mi, context, &result.handle, path.handle(), instance.handle(), nullptr));
 }
 
-void Provider::remove(const CMPIObjectPath* path) const {
+void Provider::remove(const OwnPath& path) const {
     CapturedResult result;
     CMPIInstanceMI* mi = connection.instances;
-    requireOk(mi->ft->deleteInstance(mi, context, &result.handle, path));
+    requireOk(mi->ft->deleteInstance(mi, context, &result.handle, path.handle()));
 }
 
-Provider::Paths Provider::associatorNames(const CMPIObjectPath* path, const char* associationClass) const {
+Provider::Paths Provider::associatorNames(const OwnPath& path, const char* associationClass) const {
     CapturedResult result;
     const char* const any = nullptr;
-    answer<&CMPIAssociationMIFT::associatorNames>(result, connection.associations, context, path, associationClass, any,
-                                                  any, any);
+    answer<&CMPIAssociationMIFT::associatorNames>(result, connection.associations, context, path.handle(),
+                                                  associationClass, any, any, any);
     return result.paths;
 }
 

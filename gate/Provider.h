@@ -2,6 +2,7 @@
 
 #include "CapturedResult.h"
 #include "Gate.h"
+#include "OwnObjects.h"
 
 #include <cmpift.h>
 
@@ -27,22 +28,24 @@ public:
 
     explicit Provider(const CMPIContext* itsContext) : context(itsContext) {}
 
-    Paths names(const CMPIObjectPath* classPath) const;
-    Instances instances(const CMPIObjectPath* classPath) const;
+    Paths names(const OwnPath& classPath) const;
+    Instances instances(const OwnPath& classPath) const;
 
     /** Null when there is none. */
-    const CMPIInstance* get(const CMPIObjectPath* path) const;
+    const CMPIInstance* get(const OwnPath& path) const;
 
-    void create(const CMPIObjectPath* path, const CMPIInstance* instance) const;
-    void modify(const CMPIObjectPath* path, const CMPIInstance* instance) const;
-    void remove(const CMPIObjectPath* path) const;
+    void create(const OwnPath& path) const;
+    void modify(const OwnPath& path, const OwnInstance& instance) const;
+    void remove(const OwnPath& path) const;
 
-    Paths associatorNames(const CMPIObjectPath* path, const char* associationClass) const;
+    Paths associatorNames(const OwnPath& path, const char* associationClass) const;
 
     /** Ends both interfaces, as the object manager does that ends itself. */
     void cleanUp() const;
 
 private:
+    bool isListed(const OwnPath& path) const;
+
     Turn turn;
     const CMPIContext* context;
 };

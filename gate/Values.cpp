@@ -105,23 +105,6 @@ const CMPIValue* asValue(const std::string& text) {
     return reinterpret_cast<const CMPIValue*>(text.c_str());
 }
 
-CMPIValue scalarFrom(const std::string& text, CMPIType type) {
-    CMPIValue value{};
-    if (type == CMPI_boolean) {
-        value.boolean = text == "true" ? 1 : 0;
-    } else if (type == CMPI_uint16) {
-        value.uint16 = static_cast<CMPIUint16>(numberIn(text).value_or(0));
-    } else {
-        value.uint32 = numberIn(text).value_or(0);
-    }
-    return value;
-}
-
-void set(const CMPIInstance* instance, const char* name, const CMPIValue* value, CMPIType type) {
-    const CMPIStatus status = tell<&CMPIInstanceFT::setProperty>(instance, name, value, type);
-    require(status.rc == CMPI_RC_OK, "set a property", status);
-}
-
 void add(const CMPIObjectPath* path, const char* name, const CMPIValue* value, CMPIType type) {
     // The table's function takes a path that may be changed, unlike the paths that are handed around.
     const CMPIStatus status = tell<&CMPIObjectPathFT::addKey>(const_cast<CMPIObjectPath*>(path), name, value, type);
@@ -173,24 +156,22 @@ CMPIObjectPath* referenceOf(const CMPIObjectPath* path, const char* key) {
     return isUsable ? answer.value.value.ref : nullptr;
 }
 
-void setProperty(const CMPIBroker* broker, const CMPIInstance* instance, const Property& property,
-                 const std::string& text) {
-    if (property.type == CMPI_string) {
-        set(instance, property.name, asValue(text), CMPI_chars);
-    } else if (property.type == CMPI_dateTime) {
-        CMPIValue value{};
-        value.dateTime = make<&CMPIBrokerEncFT::newDateTimeFromChars>(broker, text.c_str());
-        require(value.dateTime != nullptr, "make a datetime");
-        set(instance, property.name, &value, CMPI_dateTime);
+CMPIValue scalarFrom(const std::string& text, CMPIType type) {
+    CMPIValue value{};
+    if (type == CMPI_boolean) {
+        value.boolean = text == "true" ? 1 : 0;
+    } else if (type == CMPI_uint16) {
+        value.uint16 = static_cast<CMPIUint16>(numberIn(text).value_or(0));
     } else {
-        const CMPIValue value = scalarFrom(text, property.type);
-        set(instance, property.name, &value, property.type);
+        value.uint32 = numberIn(text).value_or(0);
     }
+    return value;
 }
 
 void setReference(const CMPIInstance* instance, const char* name, const CMPIObjectPath* target) {
     const CMPIValue value = reference(target);
-    set(instance, name, &value, CMPI_ref);
+    const CMPIStatus status = tell<&CMPIInstanceFT::setProperty>(instance, name, &value, CMPIType{CMPI_ref});
+    require(status.rc == CMPI_RC_OK, "set a property", status);
 }
 
 void addKey(const CMPIObjectPath* path, const char* name, const std::string& text) {

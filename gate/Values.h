@@ -33,9 +33,8 @@ std::optional<std::string> keyOf(const CMPIObjectPath* path, const Property& pro
 /** A key or property that refers to an object; null when there is none. */
 CMPIObjectPath* referenceOf(const CMPIObjectPath* path, const char* key);
 
-/** Sets a property from its text; fails when the object manager cannot. */
-void setProperty(const CMPIBroker* broker, const CMPIInstance* instance, const Property& property,
-                 const std::string& text);
+/** The number or flag that a text stands for. */
+CMPIValue scalarFrom(const std::string& text, CMPIType type);
 
 /** Sets a property that refers to an object. */
 void setReference(const CMPIInstance* instance, const char* name, const CMPIObjectPath* target);

@@ -143,3 +143,12 @@ TEST_F(AgentSettingsTest, NoteUnknownKeysButNotTheLogs) {
                                       "configuration key instrumentation.x is unknown; ignored",
                                       "configuration key color is unknown; ignored"));
 }
+
+TEST_F(AgentSettingsTest, KeepTheSwitchesThatAreSetByTableAndKey) {
+    EXPECT_THAT(read("").flags, IsEmpty());
+    EXPECT_THAT(read("[gate]\nrefuse_lossy_values = false\n").flags,
+                ElementsAre(Pair("gate.refuse_lossy_values", false)));
+    EXPECT_THAT(problems, IsEmpty());
+    EXPECT_THAT(read("[gate]\nrefuse_lossy_values = 1\nrefuse = true\n").flags, IsEmpty());
+    EXPECT_THAT(problems, testing::SizeIs(2));
+}

@@ -1,0 +1,203 @@
+#include "GateFixture.h"
+
+#include <functional>
+#include <map>
+#include <stdexcept>
+
+// Brokers whose functions fail, answer nothing or throw.
+
+namespace gatetest {
+namespace {
+
+using testing::ElementsAre;
+using testing::HasSubstr;
+
+constexpr CMPIrc brokerCode = CMPI_RC_ERR_ACCESS_DENIED;
+
+/** What the gate calls of a broker, itself or through the provider, besides what makes its messages. */
+const std::vector<std::string> functions{
+    "CMPIBrokerEncFT.newObjectPath",    "CMPIBrokerEncFT.newInstance",   "CMPIBrokerEncFT.newDateTimeFromChars",
+    "CMPIBrokerFT.enumerateInstances",  "CMPIObjectPathFT.addKey",       "CMPIObjectPathFT.getNameSpace",
+    "CMPIObjectPathFT.getClassName",    "CMPIObjectPathFT.getKeyCount",  "CMPIObjectPathFT.getKey",
+    "CMPIObjectPathFT.getKeyAt",        "CMPIInstanceFT.getObjectPath",  "CMPIInstanceFT.getProperty",
+    "CMPIInstanceFT.getPropertyCount",  "CMPIInstanceFT.getPropertyAt",  "CMPIInstanceFT.setProperty",
+    "CMPIInstanceFT.setPropertyFilter", "CMPIEnumerationFT.hasNext",     "CMPIEnumerationFT.getNext",
+    "CMPIResultFT.returnInstance",      "CMPIResultFT.returnObjectPath", "CMPIResultFT.returnDone",
+};
+
+/** Two leases, the first of which no request of these tests names. */
+class BrokerFailureTest : public GateTest {
+protected:
+    using Operation = std::function<Outcome()>;
+
+    BrokerFailureTest() {
+        create("bystander", {named("Lessor", text("First"))});
+        create(secondPlace, {named("Lessor", text("ACME")), named("LeaseTerm", uint32(1)),
+                             named("BaseTermCommencementDate", testsupport::dateTime("20260101000000.000000+060"))});
+    }
+
+    std::map<std::string, Operation> operations() {
+        const ObjectPath path = keyedPath(lease, secondPlace);
+        const cimhost::PropertyList list{{"Lessor"}};
+        return {
+            {"enumerate", [=] { return gate().enumerateInstances(classPath(lease), list); }},
+            {"enumerateNames", [=] { return gate().enumerateInstanceNames(classPath(lease)); }},
+            {"get", [=] { return gate().getInstance(path, list); }},
+            {"create", [=] { return create("L3", {named("Lessor", text("New"))}); }},
+            {"modify", [=] { return modify(secondPlace, {named("Lessor", text("Other"))}); }},
+            {"delete", [=] { return remove(secondPlace); }},
+            {"associators", [=] { return gate().associators(path, {}, list); }},
+            {"associatorNames", [=] { return gate().associatorNames(computerPath("beta"), {}); }},
+            {"references", [=] { return gate().references(path, {}); }},
+            {"enumerateAssociations", [=] { return gate().enumerateInstances(classPath(leaseSetting)); }},
+        };
+    }
+
+    /** How often a good run of the operation calls a function; the operation's effects are undone. */
+    int callsOf(const std::string& function, const Operation& operation) {
+        broker.forget();
+        EXPECT_EQ(operation().rc, CMPI_RC_OK);
+        const int count = broker.count(function);
+        restore();
+        return count;
+    }
+
+    /** Makes the two leases what they were, whatever became of them. */
+    void restore() {
+        gate().deleteInstance(keyedPath(lease, "L3"));
+        create(secondPlace);
+        EXPECT_THAT(modify(secondPlace,
+                           {named("Lessor", text("ACME")), named("LeaseTerm", uint32(1)),
+                            named("BaseTermCommencementDate", testsupport::dateTime("20260101000000.000000+060"))}),
+                    isDone());
+    }
+
+    std::vector<std::string> state() {
+        std::vector<std::string> shown;
+        for (const Instance& instance : gate().enumerateInstances(classPath(lease)).instances()) {
+            shown.push_back(*valueIn(instance, "InstanceID") + " " + valueIn(instance, "Lessor").value_or("(none)"));
+        }
+        return shown;
+    }
+
+    void expectSaneAnswer(const Outcome& outcome, const std::string& what) {
+        EXPECT_FALSE(outcome.threw) << what;
+        if (outcome.rc != CMPI_RC_OK) {
+            EXPECT_FALSE(outcome.message.empty()) << what;
+        }
+        EXPECT_THAT(state(), testing::Contains("bystander First")) << what;
+    }
+};
+
+class EachOperationTest : public BrokerFailureTest, public testing::WithParamInterface<const char*> {};
+
+TEST_P(EachOperationTest, EachFunctionMayFailAtEachCall) {
+    const Operation operation = operations().at(GetParam());
+    const std::vector<std::string> before = state();
+    for (const std::string& function : functions) {
+        const int calls = callsOf(function, operation);
+        for (int call = 1; call <= calls; ++call) {
+            const std::string what = function + " fails at call " + std::to_string(call);
+            broker.failCall(function, call, brokerCode);
+            const Outcome outcome = operation();
+            broker.obey();
+            expectSaneAnswer(outcome, what);
+            if (outcome.rc != CMPI_RC_OK) {
+                EXPECT_EQ(state(), before) << what << ": " << outcome.message;
+            }
+            restore();
+            ASSERT_FALSE(HasFailure()) << what;
+        }
+    }
+}
+
+TEST_P(EachOperationTest, EachFunctionMayAnswerNothingAlways) {
+    const Operation operation = operations().at(GetParam());
+    for (const std::string& function : functions) {
+        broker.answerNothingEver(function);
+        const Outcome outcome = operation();
+        broker.obey();
+        expectSaneAnswer(outcome, function + " answers nothing");
+        restore();
+    }
+}
+
+INSTANTIATE_TEST_SUITE_P(Gate, EachOperationTest,
+                         testing::Values("enumerate", "enumerateNames", "get", "create", "modify", "delete",
+                                         "associators", "associatorNames", "references", "enumerateAssociations"),
+                         [](const auto& parameter) { return std::string(parameter.param); });
+
+TEST_F(BrokerFailureTest, AnAnswerThatCannotBeMadeWholeIsNotGivenInPart) {
+    for (const char* maker : {"CMPIBrokerEncFT.newObjectPath", "CMPIBrokerEncFT.newInstance"}) {
+        broker.failCall(maker, 2, brokerCode);
+        EXPECT_THAT(gate().enumerateInstances(classPath(lease)), isRefused(CMPI_RC_ERR_FAILED, "object manager"));
+        broker.obey();
+    }
+}
+
+/** A broker that throws from one of its functions, at one of the next calls. */
+struct ThrowingBroker {
+    static inline int callsUntilThrow = 0;
+    static inline bool throwsStandard = false;
+    static inline CMPIObjectPath* (*original)(const CMPIBroker*, const char*, const char*, CMPIStatus*) = nullptr;
+
+    explicit ThrowingBroker(const CMPIBroker& real) : makers(*real.eft), broker(real) {
+        original = makers.newObjectPath;
+        makers.newObjectPath = &newObjectPath;
+        broker.eft = &makers;
+    }
+
+    static CMPIObjectPath* newObjectPath(const CMPIBroker* broker, const char* nameSpace, const char* className,
+                                         CMPIStatus* rc) {
+        if (--callsUntilThrow == 0) {
+            if (throwsStandard) {
+                throw std::runtime_error("thrown by the broker");
+            }
+            throw 42;
+        }
+        return original(broker, nameSpace, className, rc);
+    }
+
+    CMPIBrokerEncFT makers;
+    CMPIBroker broker;
+};
+
+TEST_F(BrokerFailureTest, NoExceptionOfAnyKindLeavesAndTheNextRequestIsServed) {
+    ThrowingBroker throwing(*broker.handle());
+    gate().createInstanceMI(&throwing.broker, nullptr);
+    gate().createAssociationMI(&throwing.broker, nullptr);
+    for (const bool isStandard : {false, true}) {
+        ThrowingBroker::throwsStandard = isStandard;
+        for (const auto& [name, operation] : operations()) {
+            for (int call = 1; call <= 3; ++call) {
+                ThrowingBroker::callsUntilThrow = call;
+                const Outcome outcome = operation();
+                ThrowingBroker::callsUntilThrow = 0;
+                expectSaneAnswer(outcome, name);
+                restore();
+            }
+        }
+    }
+    ThrowingBroker::callsUntilThrow = 1;
+    ThrowingBroker::throwsStandard = false;
+    EXPECT_THAT(gate().enumerateInstances(classPath(lease)), isRefused(CMPI_RC_ERR_FAILED, "exception"));
+    unload();  // before the broker goes
+}
+
+TEST_F(BrokerFailureTest, LooseBrokersServe) {
+    for (const auto manager : {testsupport::Manager::sfcb, testsupport::Manager::openPegasus}) {
+        testsupport::RecordingBroker loose;
+        loose.poseAs(manager);
+        loose.serve("VELKO_ComputerSystem", {testsupport::instance(computerPath("beta"))});
+        gate().createInstanceMI(loose.handle(), nullptr);
+        gate().createAssociationMI(loose.handle(), nullptr);
+        for (const auto& [name, operation] : operations()) {
+            EXPECT_EQ(operation().rc, CMPI_RC_OK) << name;
+            restore();
+        }
+        unload();
+    }
+}
+
+}  // namespace
+}  // namespace gatetest

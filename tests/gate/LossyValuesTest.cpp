@@ -1,0 +1,130 @@
+#include "GateFixture.h"
+
+#include "support/Files.h"
+
+#include <dlfcn.h>
+
+// Values that the data files would not give back.
+
+namespace gatetest {
+namespace {
+
+using testing::ElementsAre;
+using testing::IsEmpty;
+using testsupport::dateTime;
+
+using LossyValuesTest = GateTest;
+
+/** Turns the refusal off in the agent's configuration while it lives. */
+class RefusalOff {
+public:
+    RefusalOff() : before(testsupport::readFile(file())) {
+        testsupport::writeFile(file(), before + "\n[gate]\nrefuse_lossy_values = false\n");
+    }
+    ~RefusalOff() { testsupport::writeFile(file(), before); }
+    RefusalOff(const RefusalOff&) = delete;
+    RefusalOff& operator=(const RefusalOff&) = delete;
+
+private:
+    static std::filesystem::path file() { return agentEnvironment::directory() / "agent.toml"; }
+
+    std::string before;
+};
+
+const std::vector<std::pair<std::string, std::string>> lossyTexts{{"ACME_Leasing", "underscore"},
+                                                                  {"two\nlines", "line break"},
+                                                                  {"a\ttab", "tab"},
+                                                                  {"a\rb", "line break"},
+                                                                  {" leading", "blank"},
+                                                                  {"trailing ", "blank"},
+                                                                  {"two  blanks", "blanks"},
+                                                                  {"*", "*"},
+                                                                  {"x", "one character"},
+                                                                  {" ", "blank"}};
+
+TEST_F(LossyValuesTest, AreRefusedWithTheReasonBeforeAnythingIsStored) {
+    create("L1", {named("Lessor", text("ACME"))});
+    const std::string stored = testsupport::readFile(dataFile("Lease.dat"));
+    for (const auto& [value, reason] : lossyTexts) {
+        const auto refused = isRefused(CMPI_RC_ERR_INVALID_PARAMETER, reason);
+        EXPECT_THAT(modify("L1", {named("LeaseTerm", uint32(1)), named("Lessor", text(value))}), refused) << value;
+        EXPECT_THAT(create("L2", {named("BaseRent", text(value))}), refused) << value;
+    }
+    EXPECT_EQ(testsupport::readFile(dataFile("Lease.dat")), stored);
+    EXPECT_THAT(identifiers(), ElementsAre("L1"));
+}
+
+TEST_F(LossyValuesTest, AreRefusedAsIdentifiersToo) {
+    for (const char* id : {"a_b", "a\tb", "a\nb", " a", "a ", "a  b"}) {
+        EXPECT_THAT(create(id), isRefused(CMPI_RC_ERR_INVALID_PARAMETER, "InstanceID")) << id;
+        EXPECT_THAT(create(id, {}, warranty), isRefused(CMPI_RC_ERR_INVALID_PARAMETER, "InstanceID")) << id;
+    }
+    EXPECT_THAT(identifiers(), IsEmpty());
+    for (const char* id : {"x", "*", "a b", "/system/computer"}) {
+        EXPECT_THAT(create(id), isAnswered(1)) << id << " comes back";
+    }
+    unload();
+    EXPECT_THAT(identifiers(), ElementsAre("x", "*", "a b", "/system/computer"));
+}
+
+TEST_F(LossyValuesTest, DatesThatAreNoneAreRefused) {
+    create("L1");
+    for (const char* date : {"20261301000000.000000+000", "20260230000000.000000+000", "20260101240000.000000+000",
+                             "2026010100****.******+000", "00000000000000.000000-000", "yesterday", ""}) {
+        EXPECT_THAT(modify("L1", {named("BaseTermCommencementDate", text(date))}),
+                    isRefused(CMPI_RC_ERR_INVALID_PARAMETER, "BaseTermCommencementDate"))
+            << date;
+    }
+    for (const char* date : {"20260101000000.000000+060", "00000012000000.000000:000"}) {
+        EXPECT_THAT(modify("L1", {named("BaseTermCommencementDate", dateTime(date))}), isDone()) << date;
+        EXPECT_EQ(valueIn(got("L1"), "BaseTermCommencementDate"), date);
+    }
+}
+
+TEST_F(LossyValuesTest, WhatIsKeptIsTaken) {
+    create("L1");
+    for (const char* value : {"ACME Leasing Co", "**", "", "1.250,00 \xe2\x82\xac", "\"quoted\""}) {
+        EXPECT_THAT(modify("L1", {named("Lessor", text(value))}), isDone()) << value;
+        EXPECT_EQ(valueIn(got("L1"), "Lessor"), value);
+    }
+}
+
+TEST_F(LossyValuesTest, AValueThatIsThereAlreadyMayComeBack) {
+    {
+        const RefusalOff off;
+        create("L1", {named("Lessor", text("ACME_Leasing"))});
+        unload();
+    }
+    testsupport::writeFile(dataFile("Lease.dat"),
+                           "1\nL1\nA_\n00000000000000.000000-000\n0\n0\n0\n0\n0\n*\n*\n*\n*\n0\n");
+    EXPECT_EQ(valueIn(got("L1"), "Lessor"), "A ") << "a trailing blank, as the file tells it";
+    EXPECT_THAT(modify("L1", {named("Lessor", text("A ")), named("LeaseTerm", uint32(3))}), isDone());
+    EXPECT_EQ(valueIn(got("L1"), "LeaseTerm"), "3");
+}
+
+TEST_F(LossyValuesTest, AreTakenWhereTheOperatorWantsThat) {
+    const RefusalOff off;
+    for (const char* value : {"ACME_Leasing", "a\ttab", " leading", "two  blanks", "*", "x"}) {
+        const std::string id = "id_" + std::to_string(identifiers().size());
+        EXPECT_THAT(create(id, {named("Lessor", text(value))}), isAnswered(1)) << value;
+        EXPECT_EQ(valueIn(got(id), "Lessor"), value);
+    }
+    EXPECT_THAT(create("L1", {named("Lessor", text("two\nlines"))}), isAnswered(1));
+    EXPECT_THAT(modify("L1", {named("LeaseTerm", uint32(3))}), isDone()) << "with lines that are too many";
+    EXPECT_THAT(remove("L1"), isDone());
+    unload();  // before the configuration is as it was
+}
+
+TEST_F(LossyValuesTest, AreRefusedAlsoWithAnAgentThatKnowsNoSwitches) {
+    const RefusalOff off;
+    // The one that is in the process already is the one that the gate finds.
+    void* framework = dlopen(FRAMEWORK_WITHOUT_SETTINGS, RTLD_NOW | RTLD_LOCAL);
+    ASSERT_NE(framework, nullptr) << dlerror();
+    EXPECT_THAT(create("a_b"), isRefused(CMPI_RC_ERR_INVALID_PARAMETER, "underscore"));
+    EXPECT_THAT(create("L1"), isAnswered(1));
+    unload();
+    dlclose(framework);
+}
+
+}  // namespace
+}  // namespace gatetest

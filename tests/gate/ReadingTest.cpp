@@ -1,0 +1,156 @@
+#include "GateFixture.h"
+
+// Reading, and the one class besides leases and warranties that can be changed.
+
+namespace gatetest {
+namespace {
+
+using testing::Contains;
+using testing::ElementsAre;
+using testing::IsEmpty;
+using testing::Not;
+using testing::UnorderedElementsAre;
+using testsupport::dateTime;
+using testsupport::namesOf;
+
+using ReadingTest = GateTest;
+
+TEST_F(ReadingTest, PropertyListsAreAppliedAndKeysStay) {
+    create("L1", {named("Lessor", text("ACME")), named("LeaseTerm", uint32(12))});
+    const cimhost::PropertyList list{{"lessor", "RenewalOption", "NoSuchProperty"}};
+    const auto expected = UnorderedElementsAre("InstanceID", "Lessor", "RenewalOption");
+    const Outcome one = gate().getInstance(keyedPath(lease, "L1"), list);
+    ASSERT_THAT(one, isAnswered(1));
+    EXPECT_THAT(namesOf(one.instances().front().properties), expected);
+    EXPECT_EQ(valueIn(one.instances().front(), "Lessor"), "ACME");
+    EXPECT_EQ(testsupport::toText(one.instances().front().path), "root/cimv2:VELKO_Lease.InstanceID=\"L1\"");
+    const Outcome all = gate().enumerateInstances(classPath(lease), list);
+    ASSERT_THAT(all, isAnswered(1));
+    EXPECT_THAT(namesOf(all.instances().front().properties), expected);
+    const Outcome keys = gate().enumerateInstances(classPath(lease), cimhost::PropertyList(std::vector<std::string>{}));
+    ASSERT_THAT(keys, isAnswered(1));
+    EXPECT_THAT(namesOf(keys.instances().front().properties), ElementsAre("InstanceID"));
+}
+
+TEST_F(ReadingTest, AListOfEveryPropertyIsAsGoodAsNone) {
+    create("L1", {named("Lessor", text("ACME"))});
+    const Instance whole = got("L1");
+    std::vector<std::string> everything{"Caption", "Description", "ConfigurationName", "ChangeableType",
+                                        "BaseTermCommencementDate"};
+    for (const std::string& name : namesOf(whole.properties)) {
+        everything.push_back(name);
+    }
+    const Outcome listed = gate().getInstance(keyedPath(lease, "L1"), everything);
+    ASSERT_THAT(listed, isAnswered(1));
+    EXPECT_EQ(namesOf(listed.instances().front().properties), namesOf(whole.properties));
+}
+
+TEST_F(ReadingTest, NullPropertiesOnTheListStayNull) {
+    create("L1");
+    const Outcome outcome = gate().getInstance(keyedPath(lease, "L1"), {{"BaseTermCommencementDate"}});
+    ASSERT_THAT(outcome, isAnswered(1));
+    EXPECT_TRUE(testsupport::isNull(outcome.instances().front().properties, "BaseTermCommencementDate"));
+}
+
+TEST_F(ReadingTest, TheAgentIsGotByAllItsKeys) {
+    const Outcome names = gate().enumerateInstanceNames(classPath(agent));
+    ASSERT_THAT(names, isAnswered(1));
+    ObjectPath path = names.paths().front();
+    EXPECT_THAT(gate().getInstance(path), isAnswered(1));
+    path.keys.front() = named(path.keys.front().name, text("other"));
+    EXPECT_THAT(gate().getInstance(path), isRefused(CMPI_RC_ERR_NOT_FOUND, agent));
+    path.keys.pop_back();
+    EXPECT_THAT(gate().getInstance(path), isRefused(CMPI_RC_ERR_INVALID_PARAMETER, "key"));
+}
+
+class AssetTest : public GateTest {
+protected:
+    ObjectPath path() { return gate().enumerateInstanceNames(classPath(asset)).paths().front(); }
+
+    Outcome change(std::vector<NamedValue> properties) {
+        return gate().modifyInstance(path(), testsupport::instance(path(), std::move(properties)));
+    }
+
+    Instance current() {
+        const Outcome outcome = gate().getInstance(path());
+        EXPECT_THAT(outcome, isAnswered(1));
+        return outcome.instances().empty() ? Instance{} : outcome.instances().front();
+    }
+};
+
+TEST_F(AssetTest, AChangeOfOnePropertyLeavesAllOthersAsTheyWere) {
+    EXPECT_THAT(change({named("PersonalizedLabel1", text("Room")), named("PersonalizedData1", text("12")),
+                        named("PersonalizedLabel2", text("Floor")), named("PersonalizedData2", text("3")),
+                        named("PrimaryOwnerName", text("Jo Example"))}),
+                isDone());
+    const Instance before = current();
+    EXPECT_EQ(valueIn(before, "PersonalizedLabel3"), "Null") << "not the label before it";
+    EXPECT_THAT(change({named("PersonalizedData2", text("4")), named("PrimaryOwnerPhone", text("+49 1"))}), isDone());
+    const Instance after = current();
+    for (const std::string& name : namesOf(after.properties)) {
+        if (name == "PersonalizedData2") {
+            EXPECT_EQ(valueIn(after, name), "4");
+        } else if (name == "PrimaryOwnerPhone") {
+            EXPECT_EQ(valueIn(after, name), "+49 1");
+        } else if (name != "LocalDateTime") {
+            EXPECT_EQ(valueIn(after, name), valueIn(before, name)) << name;
+        }
+    }
+}
+
+TEST_F(AssetTest, AnInstanceThatComesBackAsItWasReadIsAccepted) {
+    change({named("ZOPMProfile", text("Office")), named("AssetNumber", text("A_1 _ 2"))});
+    Instance sent = current();
+    for (NamedValue& property : sent.properties) {
+        // Sent back some time after it was read.
+        property =
+            property.name == "LocalDateTime" ? named("LocalDateTime", dateTime("20200101120000.000000+000")) : property;
+        property = property.name == "ZOPMProfile" ? named("ZOPMProfile", text("Factory")) : property;
+    }
+    EXPECT_THAT(gate().modifyInstance(path(), sent), isDone());
+    EXPECT_EQ(valueIn(current(), "ZOPMProfile"), "Factory");
+    EXPECT_EQ(valueIn(current(), "DeploymentProfile"), "Factory");
+}
+
+TEST_F(AssetTest, ReadOnlyPropertiesAreRefusedByName) {
+    const std::vector<NamedValue> readOnly{named("AssetIdTag", text("x")), named("DeploymentProfile", text("x")),
+                                           named("Vendor", text("x")), named("AssetIDStringArea", uint32(1))};
+    for (const NamedValue& property : readOnly) {
+        EXPECT_THAT(change({named("AssetNumber", text("A1")), property}),
+                    isRefused(CMPI_RC_ERR_INVALID_PARAMETER, property.name));
+    }
+    EXPECT_EQ(valueIn(current(), "AssetNumber"), "");
+}
+
+TEST_F(AssetTest, TextsAreKeptAsTheyAreAndCanBeEmptied) {
+    const std::string odd = " a_b\n* ";
+    EXPECT_THAT(change({named("AssetNumber", text(odd)), named("PersonalizedData1", text("x"))}), isDone());
+    unload();
+    EXPECT_EQ(valueIn(current(), "AssetNumber"), odd);
+    EXPECT_THAT(change({named("AssetNumber", text("")), named("PersonalizedData1", text(""))}), isDone());
+    EXPECT_EQ(valueIn(current(), "AssetNumber"), "");
+    EXPECT_EQ(valueIn(current(), "PersonalizedData1"), "Null");
+}
+
+TEST_F(AssetTest, OnlyDatesThatAreDatesAreTaken) {
+    EXPECT_THAT(change({named("PurchaseDate", dateTime("20260229000000.000000+000"))}),
+                isRefused(CMPI_RC_ERR_INVALID_PARAMETER, "PurchaseDate"));
+    EXPECT_THAT(change({named("PurchaseDate", dateTime("00000001000000.000000:000"))}),
+                isRefused(CMPI_RC_ERR_INVALID_PARAMETER, "PurchaseDate"));
+    EXPECT_THAT(change({named("PurchaseDate", dateTime("20240229235959.123456-480"))}), isDone());
+    EXPECT_EQ(valueIn(current(), "PurchaseDate"), "20240229235959.123456-480");
+}
+
+TEST_F(AssetTest, APathOfAnotherComputerIsNotFound) {
+    ObjectPath other = path();
+    for (NamedValue& key : other.keys) {
+        key = key.name == "Name" ? named("Name", text("gamma")) : key;
+    }
+    EXPECT_THAT(gate().modifyInstance(other, testsupport::instance(other, {named("AssetNumber", text("A1"))})),
+                isRefused(CMPI_RC_ERR_NOT_FOUND, asset));
+    EXPECT_THAT(gate().getInstance(other), isRefused(CMPI_RC_ERR_NOT_FOUND, asset));
+    EXPECT_EQ(valueIn(current(), "AssetNumber"), "");
+}
+
+}  // namespace
+}  // namespace gatetest
