@@ -1,0 +1,85 @@
+#include "ManagedGate.h"
+
+#include "cli/ClassShapes.h"
+#include "schema/MofReader.h"
+#include "support/Files.h"
+
+#include <regex>
+
+namespace gatetest {
+
+namespace {
+
+std::filesystem::path configuration() {
+    return agentEnvironment::directory() / "agent.toml";
+}
+
+cimhost::ObjectManagerOptions optionsOf(cimhost::Manager manager) {
+    cimhost::Schema schema;
+    cimhost::MofReader(schema).readFile(SCHEMA_MOF);
+    cimhost::ObjectManagerOptions options;
+    options.libraries.searchPath = {LIBRARIES};
+    options.classShape = cimhost::classShapes(schema);
+    options.manager = manager;
+    return options;
+}
+
+cimhost::ProviderRegistry registryOf(std::initializer_list<const char*> files) {
+    cimhost::ProviderRegistry registry;
+    for (const char* file : files) {
+        for (const auto& registration : cimhost::readRegistrationFile(file)) {
+            registry.add(registration);
+        }
+    }
+    return registry;
+}
+
+}  // namespace
+
+ManagedGate::ManagedGate(cimhost::Manager manager)
+    : host(std::make_unique<cimhost::ObjectManager>(optionsOf(manager),
+                                                    registryOf({GATE_REGISTRATION, COMPUTER_REGISTRATION}))) {}
+
+std::vector<std::string> ManagedGate::identifiers(const std::string& className) {
+    return identifiersOf(paths(className));
+}
+
+std::vector<ObjectPath> ManagedGate::paths(const std::string& className) {
+    auto answer = host->enumerateInstanceNames({}, classPath(className));
+    EXPECT_TRUE(answer.ok()) << answer.status.message;
+    return answer.value;
+}
+
+Instance ManagedGate::got(const ObjectPath& path) {
+    auto answer = host->getInstance({}, path, {});
+    EXPECT_TRUE(answer.ok()) << answer.status.message;
+    return answer.value;
+}
+
+cimhost::Status ManagedGate::create(const std::string& id, std::vector<NamedValue> properties, const std::string& of) {
+    const ObjectPath path = keyedPath(of, id);
+    properties.push_back(named("InstanceID", text(id)));
+    const auto answer = host->createInstance({}, path, testsupport::instance(path, std::move(properties)));
+    if (answer.ok()) {
+        EXPECT_EQ(testsupport::toText(answer.value), testsupport::toText(path));
+    }
+    return answer.status;
+}
+
+cimhost::Status ManagedGate::modify(const ObjectPath& path, std::vector<NamedValue> properties) {
+    return host->modifyInstance({}, path, testsupport::instance(path, std::move(properties)), {});
+}
+
+cimhost::Status ManagedGate::remove(const std::string& id, const std::string& of) {
+    return host->deleteInstance({}, keyedPath(of, id));
+}
+
+SilentLog::SilentLog() : before(testsupport::readFile(configuration())) {
+    testsupport::writeFile(configuration(), std::regex_replace(before, std::regex("_level = [0-9]+"), "_level = 0"));
+}
+
+SilentLog::~SilentLog() {
+    testsupport::writeFile(configuration(), before);
+}
+
+}  // namespace gatetest

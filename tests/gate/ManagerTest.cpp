@@ -1,0 +1,116 @@
+#include "ManagedGate.h"
+
+// Every operation of every class, under object managers as they are.
+
+namespace gatetest {
+namespace {
+
+using cimhost::Manager;
+using testing::ElementsAre;
+using testing::HasSubstr;
+using testing::IsEmpty;
+using testing::SizeIs;
+using testing::UnorderedElementsAre;
+
+class ManagerTest : public testing::TestWithParam<Manager> {
+protected:
+    ManagerTest() { agentEnvironment::clear(); }
+    ~ManagerTest() override { agentEnvironment::clear(); }
+
+    void expectStatus(const cimhost::Status& status, CMPIrc rc) {
+        EXPECT_EQ(status.rc, rc) << status.message;
+        EXPECT_EQ(status.message.empty(), rc == CMPI_RC_OK);
+    }
+
+    ManagedGate gate{GetParam()};
+};
+
+TEST_P(ManagerTest, LeasesAndWarrantiesAreCreatedReadChangedAndDeleted) {
+    for (const auto& [of, property] : {std::pair(lease, "Lessor"), std::pair(warranty, "Warrantor")}) {
+        expectStatus(gate.create("A1", {named(property, text("ACME"))}, of), CMPI_RC_OK);
+        expectStatus(gate.create("A2", {}, of), CMPI_RC_OK);
+        expectStatus(gate.create("A1", {}, of), CMPI_RC_ERR_ALREADY_EXISTS);
+        EXPECT_THAT(gate.identifiers(of), ElementsAre("A1", "A2"));
+        const ObjectPath path = keyedPath(of, "A1");
+        EXPECT_EQ(valueIn(gate.got(path), property), "ACME");
+        expectStatus(gate.modify(path, {named(property, text("Other"))}), CMPI_RC_OK);
+        EXPECT_EQ(valueIn(gate.got(path), property), "Other");
+        expectStatus(gate.modify(path, gate.got(path).properties), CMPI_RC_OK);
+        expectStatus(gate.modify(path, {named("ElementName", text("x"))}), CMPI_RC_ERR_INVALID_PARAMETER);
+        expectStatus(gate.remove("A1", of), CMPI_RC_OK);
+        EXPECT_THAT(gate.identifiers(of), ElementsAre("A2"));
+        EXPECT_THAT(gate.manager().enumerateInstances({}, classPath(of), {}).value, SizeIs(1));
+        expectStatus(gate.remove("A1", of), CMPI_RC_ERR_NOT_FOUND);
+        expectStatus(gate.modify(path, {named(property, text("x"))}), CMPI_RC_ERR_NOT_FOUND);
+        expectStatus(gate.manager().getInstance({}, path, {}).status, CMPI_RC_ERR_NOT_FOUND);
+    }
+}
+
+TEST_P(ManagerTest, ARecordWithoutIdentifierIsNotCreated) {
+    const ObjectPath path = classPath(lease);
+    expectStatus(gate.manager().createInstance({}, path, testsupport::instance(path)).status,
+                 CMPI_RC_ERR_INVALID_PARAMETER);
+    expectStatus(gate.create("", {}), CMPI_RC_ERR_INVALID_PARAMETER);
+    EXPECT_THAT(gate.identifiers(lease), IsEmpty());
+}
+
+TEST_P(ManagerTest, TheAgentIsReadAndCannotBeChanged) {
+    const auto paths = gate.paths(agent);
+    ASSERT_THAT(paths, SizeIs(1));
+    EXPECT_EQ(valueIn(gate.got(paths.front()), "Version"), "4.2.0");
+    EXPECT_THAT(gate.manager().enumerateInstances({}, classPath(agent), {}).value, SizeIs(1));
+    expectStatus(gate.modify(paths.front(), {}), CMPI_RC_ERR_NOT_SUPPORTED);
+}
+
+TEST_P(ManagerTest, AssetDataAreReadAndChanged) {
+    const auto paths = gate.paths(asset);
+    ASSERT_THAT(paths, SizeIs(2)) << "one a computer";
+    expectStatus(gate.modify(paths.front(), {named("PersonalizedData2", text("second"))}), CMPI_RC_OK);
+    std::vector<NamedValue> sent = gate.got(paths.front()).properties;
+    for (NamedValue& property : sent) {
+        property = property.name == "AssetNumber" ? named("AssetNumber", text("A 1")) : property;
+    }
+    expectStatus(gate.modify(paths.front(), sent), CMPI_RC_OK);
+    const Instance changed = gate.got(paths.front());
+    EXPECT_EQ(valueIn(changed, "AssetNumber"), "A 1");
+    EXPECT_EQ(valueIn(changed, "PersonalizedData2"), "second");
+    EXPECT_EQ(valueIn(changed, "PersonalizedData3"), "Null");
+}
+
+TEST_P(ManagerTest, AssociationsTellTheSameFromAllSides) {
+    expectStatus(gate.create(firstPlace, {}), CMPI_RC_OK);
+    expectStatus(gate.create(secondPlace, {}), CMPI_RC_OK);
+    expectStatus(gate.create(secondPlace, {}, warranty), CMPI_RC_OK);
+    const auto leases = gate.paths(leaseSetting);
+    ASSERT_THAT(leases, SizeIs(2));
+    EXPECT_THAT(gate.paths(warrantySetting), SizeIs(1));
+    EXPECT_THAT(gate.manager().enumerateInstances({}, classPath(leaseSetting), {}).value, SizeIs(2));
+    EXPECT_THAT(gate.got(leases.front()).properties, SizeIs(2));
+    const cimhost::AssociationFilter byLease{leaseSetting, {}, {}, {}};
+    const cimhost::AssociationFilter resultLease{{}, leaseSetting, {}, {}};
+    const ObjectPath beta = computerPath("beta");
+    EXPECT_THAT(identifiersOf(gate.manager().associatorNames({}, beta, byLease).value), ElementsAre(secondPlace));
+    EXPECT_THAT(gate.manager().associators({}, beta, byLease, {}).value, SizeIs(1));
+    EXPECT_THAT(gate.manager().references({}, beta, resultLease, {}).value, SizeIs(1));
+    EXPECT_THAT(gate.manager().referenceNames({}, beta, resultLease).value, SizeIs(1));
+    const ObjectPath element = keyedPath(lease, secondPlace);
+    EXPECT_THAT(shownPaths(gate.manager().associatorNames({}, element, byLease).value),
+                ElementsAre("root/cimv2:VELKO_ComputerSystem.Name=\"beta\""));
+    EXPECT_THAT(gate.manager().associators({}, element, byLease, {}).value, SizeIs(1));
+    EXPECT_THAT(gate.manager().references({}, element, resultLease, {}).value, SizeIs(1));
+    EXPECT_THAT(gate.manager().referenceNames({}, element, resultLease).value, SizeIs(1));
+}
+
+TEST_P(ManagerTest, WhatTheDataFileWouldLoseIsRefused) {
+    expectStatus(gate.create("A_1", {}), CMPI_RC_ERR_INVALID_PARAMETER);
+    const auto status = gate.create("A1", {named("Lessor", text("ACME_Leasing"))});
+    expectStatus(status, CMPI_RC_ERR_INVALID_PARAMETER);
+    EXPECT_THAT(status.message, HasSubstr("Lessor"));
+    EXPECT_THAT(gate.identifiers(lease), IsEmpty());
+}
+
+INSTANTIATE_TEST_SUITE_P(Gate, ManagerTest, testing::Values(Manager::standard, Manager::sfcb, Manager::openPegasus),
+                         [](const auto& parameter) { return std::string(cimhost::profileOf(parameter.param).name); });
+
+}  // namespace
+}  // namespace gatetest
