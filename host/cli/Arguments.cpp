@@ -6,6 +6,7 @@
 
 #include "Installation.h"
 #include "cli/ExitStatus.h"
+#include "cli/LoadArguments.h"
 
 namespace cimhost {
 namespace {
@@ -25,6 +26,7 @@ a shell keeps only inside of quotes:
   cimhost --format json ein Some_Class
   cimhost --schema my.mof --registration my.reg --library-path build/lib ei My_Class
   cimhost --as sfcb ci 'Some_Class.InstanceID="2"'
+  cimhost --as pegasus load Some_Class --clients 32 --requests 100000
 
 With --as, the providers meet the behaviour of another object manager. What would end its provider process is reported
 as an error.
@@ -181,6 +183,7 @@ ParsedArguments parseArguments(int count, const char* const* values) {
     for (const Command& command : commands) {
         addCommand(app, command, parsed.arguments);
     }
+    addLoadCommand(app, parsed.arguments);
     try {
         app.parse(count, values);
     } catch (const CLI::ParseError& error) {

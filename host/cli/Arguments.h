@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstdint>
 #include <optional>
 #include <string>
 #include <vector>
@@ -10,9 +11,25 @@ namespace cimhost {
 
 enum class Format { text, json, mof };
 
+/** What the command load was given. */
+struct LoadArguments {
+    std::vector<std::string> classes{};
+    unsigned clients = 8;
+    std::size_t requests = 10'000;
+    std::uint64_t seed = 1;
+    std::string mix{};     ///< empty: the usual one
+    std::string source{};  ///< object path; empty: none
+    std::optional<std::string> associationClass{};
+    bool fills = false;
+    bool keeps = false;
+    std::size_t shown = 10;
+};
+
 /** The command line, as it was given. */
 struct Arguments {
-    std::optional<Operation> operation{};    ///< none: list the classes
+    std::optional<Operation> operation{};  ///< none: list the classes, or run a load
+    bool isLoad = false;
+    LoadArguments load{};
     std::string target{};                    ///< class name or object path; empty for classes
     std::vector<std::string> assignments{};  ///< NAME=VALUE
     std::vector<std::string> nulls{};        ///< properties to set to null

@@ -1,12 +1,13 @@
 #include "cli/Commands.h"
 
 #include "cli/ClassList.h"
-#include "cli/ClassShapes.h"
 #include "cli/ExitStatus.h"
 #include "cli/JsonOutput.h"
+#include "cli/LoadCommand.h"
 #include "cli/Locations.h"
 #include "cli/RequestBuilder.h"
 #include "cli/TextOutput.h"
+#include "operations/ClassShapes.h"
 #include "operations/Interpretation.h"
 #include "operations/ObjectManager.h"
 #include "schema/MofReader.h"
@@ -16,6 +17,14 @@ namespace cimhost {
 namespace {
 
 using Answers = Answer<std::vector<RawAnswer>>;
+
+ObjectManagerOptions managerOptions(const Arguments& arguments, const Locations& locations, const Schema& schema) {
+    ObjectManagerOptions options;
+    options.libraries.searchPath = locations.libraryPaths;
+    options.classShape = classShapes(schema);
+    options.manager = arguments.manager;
+    return options;
+}
 
 Schema readSchema(const Locations& locations) {
     Schema schema;
@@ -118,11 +127,7 @@ Outcome runRequest(const Arguments& arguments, const Locations& locations, const
     const ProviderRegistry registry(readRegistrations(locations));
     try {
         const Request request = buildRequest(arguments, schema);
-        ObjectManagerOptions options;
-        options.libraries.searchPath = locations.libraryPaths;
-        options.classShape = classShapes(schema);
-        options.manager = arguments.manager;
-        ObjectManager manager(std::move(options), registry);
+        ObjectManager manager(managerOptions(arguments, locations, schema), registry);
         const Answers answers = manager.run(request);
         return arguments.raw ? showRaw(answers, request.operation, arguments.format)
                              : show(answers, request, arguments.format);
@@ -135,12 +140,20 @@ Outcome runRequest(const Arguments& arguments, const Locations& locations, const
 
 Outcome runCommand(const Arguments& arguments) {
     if (arguments.format == Format::mof && (arguments.raw || !arguments.operation)) {
-        throw UsageError("--format mof shows instances; use text or json with --raw and for classes");
+        throw UsageError("--format mof shows instances; use text or json with --raw, for classes and for load");
+    }
+    if (arguments.raw && arguments.isLoad) {
+        throw UsageError("--raw shows what a provider did with one request; load has many");
     }
     const Locations locations = findLocations(arguments);
     const Schema schema = readSchema(locations);
     if (arguments.operation) {
         return runRequest(arguments, locations, schema);
+    }
+    if (arguments.isLoad) {
+        ObjectManager manager(managerOptions(arguments, locations, schema),
+                              ProviderRegistry(readRegistrations(locations)));
+        return runLoadCommand(manager, arguments, schema);
     }
     const std::vector<ListedClass> classes = listClasses(schema, readRegistrations(locations));
     return {arguments.format == Format::json ? json::format(classes) : text::format(classes)};

@@ -11,6 +11,7 @@ namespace cimhost {
 struct Outcome {
     std::string output{};
     Status status{};
+    std::string complaint{};  ///< what is wrong although the request itself ended well; empty: nothing
 };
 
 /**

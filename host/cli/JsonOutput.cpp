@@ -136,7 +136,7 @@ Json propertyJson(const Property& property) {
             {"array", property.isArray},
             {"referenceClass", textOrNull(property.referenceClass)},
             {"key", property.isKey()},
-            {"writable", qualifierJson(property, "Write") == Json(true)},
+            {"writable", property.isWritable()},
             {"description", qualifierJson(property, "Description")}};
 }
 

@@ -1,7 +1,6 @@
 #include "cli/TextOutput.h"
 
-#include <algorithm>
-
+#include "cli/Table.h"
 #include "cli/Words.h"
 #include "operations/StatusText.h"
 #include "schema/CimType.h"
@@ -10,29 +9,6 @@
 
 namespace cimhost::text {
 namespace {
-
-using Row = std::vector<std::string>;
-
-/** The rows with their columns under each other; nothing is filled up after the last column. */
-std::string aligned(const std::vector<Row>& rows, const std::string& indent) {
-    std::vector<std::size_t> widths;
-    for (const Row& row : rows) {
-        widths.resize(std::max(widths.size(), row.size()));
-        for (std::size_t i = 0; i < row.size(); ++i) {
-            widths[i] = std::max(widths[i], row[i].size());
-        }
-    }
-    std::string text;
-    for (const Row& row : rows) {
-        std::string line = indent;
-        for (std::size_t i = 0; i < row.size(); ++i) {
-            line += row[i];
-            line += i + 1 < row.size() ? std::string(widths[i] - row[i].size() + 2, ' ') : "";
-        }
-        text += line + "\n";
-    }
-    return text;
-}
 
 std::string valueText(const Value& value) {
     if (value.type == CMPI_ref && !value.isArray && !value.isNull && !value.elements.empty()) {

@@ -36,6 +36,10 @@ int run(const Arguments& arguments) {
         complain(errorText(outcome.status));
         return exitCimError;
     }
+    if (!outcome.complaint.empty()) {
+        complain(outcome.complaint);
+        return exitCimError;
+    }
     return exitSuccess;
 }
 

@@ -94,6 +94,10 @@ bool Property::isKey() const {
     return isTrue(findQualifier("Key"));
 }
 
+bool Property::isWritable() const {
+    return isTrue(findQualifier("Write"));
+}
+
 const Property* Class::findProperty(std::string_view property) const {
     return findNamed(properties, property);
 }

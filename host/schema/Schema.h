@@ -47,6 +47,9 @@ struct Property {
 
     const Qualifier* findQualifier(std::string_view qualifier) const;
     bool isKey() const;
+
+    /** Whether clients may modify it: the qualifier Write is true. */
+    bool isWritable() const;
 };
 
 /** A method by its name; this host does not call methods. */

@@ -2,6 +2,7 @@
 #include <thread>
 
 #include "OperationsFixture.h"
+#include "support/Managers.h"
 
 // Many clients at a time, as every manager: providers are started, ask each other, fail and throw, and every client
 // gets the answers to its own requests.
@@ -65,8 +66,7 @@ TEST_P(ConcurrencyTest, EveryClientGetsItsOwnAnswers) {
     EXPECT_GT(logged, 0) << "factories log";
 }
 
-INSTANTIATE_TEST_SUITE_P(Managers, ConcurrencyTest,
-                         testing::Values(Manager::standard, Manager::sfcb, Manager::openPegasus),
-                         [](const auto& each) { return std::string(cimhost::profileOf(each.param).name); });
+INSTANTIATE_TEST_SUITE_P(Managers, ConcurrencyTest, testing::ValuesIn(testsupport::everyManager),
+                         testsupport::ManagerName());
 
 }  // namespace

@@ -4,6 +4,7 @@
 
 #include "OperationsFixture.h"
 #include "schema/Names.h"
+#include "support/Managers.h"
 
 // What tells the object managers apart, a test each: the standard host, SFCB, OpenPegasus.
 
@@ -98,7 +99,7 @@ TEST_F(ManagerTest, ManagersHaveNames) {
     EXPECT_EQ(cimhost::managerNamed("sfcb"), Manager::sfcb);
     EXPECT_EQ(cimhost::managerNamed("pegasus"), Manager::openPegasus);
     EXPECT_EQ(cimhost::managerNamed("SFCB"), std::nullopt);
-    for (const Manager manager : {Manager::standard, Manager::sfcb, Manager::openPegasus}) {
+    for (const Manager manager : testsupport::everyManager) {
         EXPECT_EQ(cimhost::profileOf(manager).manager, manager);
     }
 }
@@ -156,7 +157,7 @@ TEST_F(ManagerTest, APathWithoutKeysTakesThemFromTheInstance) {
 }
 
 TEST_F(ManagerTest, CreationThatReturnsAPathGivesIt) {
-    for (const Manager each : {Manager::standard, Manager::sfcb, Manager::openPegasus}) {
+    for (const Manager each : testsupport::everyManager) {
         as(each);
         EXPECT_EQ(testsupport::toText(create("Witness_Thing").value), "root/cimv2:Witness_Thing.Name=\"made\"");
     }
@@ -262,7 +263,7 @@ TEST_F(ManagerTest, TextsLoseBlanksAndOtherBytesAtTheirEnds) {
 }
 
 TEST_F(ManagerTest, NamesKeepTheClientsLetterCase) {
-    for (const Manager each : {Manager::standard, Manager::sfcb, Manager::openPegasus}) {
+    for (const Manager each : testsupport::everyManager) {
         as(each);
         manager().getInstance({}, testsupport::objectPath("root/cimv2", "WITNESS_thing", {with("nAmE", text("there"))}),
                               {});
@@ -286,7 +287,7 @@ TEST_F(ManagerTest, AProviderIsToldTheAssociationClassThatItIsAskedForOrThatTheC
 }
 
 TEST_F(ManagerTest, AnAssociationClassThatTheClientSentReachesTheProviderAsSent) {
-    for (const Manager each : {Manager::standard, Manager::sfcb, Manager::openPegasus}) {
+    for (const Manager each : testsupport::everyManager) {
         as(each);
         const auto found = manager().associators({}, path("Witness_Thing", "a"), {"WITNESS_Link", {}, {}, {}}, {});
         ASSERT_EQ(found.value.size(), 1U);
@@ -329,7 +330,7 @@ TEST_F(ManagerTest, AnUpCallRunsOnTheProvidersThreadOrOnAnother) {
 }
 
 TEST_F(ManagerTest, AFactoryMayMakeUpCallsThatStartProviders) {
-    for (const Manager each : {Manager::standard, Manager::sfcb, Manager::openPegasus}) {
+    for (const Manager each : testsupport::everyManager) {
         as(each);
         EXPECT_TRUE(manager().enumerateInstances({}, classPath("Curious_Thing"), {}).ok());
         EXPECT_THAT(log, testing::Contains("witness factory"));

@@ -1,4 +1,4 @@
-#include "cli/ClassShapes.h"
+#include "operations/ClassShapes.h"
 
 namespace cimhost {
 namespace {

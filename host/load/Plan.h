@@ -1,0 +1,31 @@
+#pragma once
+
+#include <cstdint>
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "load/LoadClass.h"
+#include "load/Mix.h"
+
+namespace cimhost::load {
+
+/** What a load does. */
+struct Plan {
+    std::vector<LoadClass> classes{};  ///< not empty
+    unsigned clients = 8;              ///< at least one
+    std::size_t requests = 10'000;     ///< of all clients
+    std::uint64_t seed = 1;
+    Mix mix{};
+    std::optional<ObjectPath> source{};  ///< whose associations are asked for; needed if the mix has associations
+    std::optional<std::string> associationClass{};
+    bool fills = false;        ///< values go along at creation
+    bool keeps = false;        ///< what is there at the end stays there
+    bool listsChanges = true;  ///< modifications send the list of what they change
+    std::size_t shown = 10;    ///< how many wrong answers are told in words
+};
+
+/** PlanError when the plan asks for what cannot be done. */
+void requireFeasible(const Plan& plan);
+
+}  // namespace cimhost::load
