@@ -1,6 +1,6 @@
 #include "ManagedGate.h"
 
-#include "cli/ClassShapes.h"
+#include "operations/ClassShapes.h"
 #include "schema/MofReader.h"
 #include "support/Files.h"
 
