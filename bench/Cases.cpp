@@ -9,6 +9,9 @@ const std::vector<std::size_t> writeSizes{10, 100, 1000, 10000};
 
 namespace {
 
+/** What the gate adds is told by the smaller tables. */
+constexpr std::size_t largestGated = 1000;
+
 /** A case whose floor has a table of that many rows. What the provider is loaded with is left open. */
 template <class Row>
 Case floorCase(std::string operation, std::size_t size, Request request) {
@@ -28,6 +31,9 @@ template <class Row>
 Case readCase(std::string operation, std::size_t size, Request request) {
     Case one = floorCase<Row>(std::move(operation), size, std::move(request));
     one.provider = [size](Workbench& bench) { return bench.loaded<Row>(size); };
+    if (size <= largestGated) {
+        one.gated = [size](Workbench& bench) { return bench.loaded<Row>(size, Entrance::gate); };
+    }
     return one;
 }
 
@@ -100,6 +106,7 @@ Case associationCase(std::string operation, std::size_t computers, Request reque
     constexpr std::size_t size = 1000;
     Case one = readCase<LeaseRow>(std::move(operation), size, std::move(request));
     one.className = "VELKO_LeaseSetting";
+    one.gated = nullptr;  // its answers are others
     one.computers = computers;
     one.floor = [](const Workbench&, const CMPIBroker* broker) {
         return makeAssociationFloor(broker, makeRows<LeaseRow>(size));

@@ -26,6 +26,9 @@ struct Case {
     std::function<std::unique_ptr<Floor>(const Workbench&, const CMPIBroker*)> floor;
     std::string changedFile{};  ///< of a request that changes records: name of the file, else empty
     std::size_t computers = 1;  ///< that the object manager knows of
+
+    /** Gives the provider behind the gate with the same table, where that is measured too: .../gate/size. */
+    std::function<Interfaces(Workbench&)> gated{};
 };
 
 /** The sizes of tables whose records are read, and of those that are written. */

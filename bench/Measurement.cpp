@@ -53,6 +53,12 @@ void measureProvider(benchmark::State& state, Workbench& bench, const Case& one)
     }
 }
 
+void measureGate(benchmark::State& state, Workbench& bench, const Case& one) {
+    const Outcome outcome = measure(state, bench, one.request, [&] { return one.gated(bench); });
+    const std::unique_ptr<Floor> floor = one.floor(bench, bench.broker().handle());
+    requireSame(outcome.events, perform(bench.broker(), one.request, floor->interfaces()).events);
+}
+
 /** Registers a benchmark that measures its own time; what it throws makes it fail. */
 void registerBenchmark(const std::string& name, bool& failed, const std::function<void(benchmark::State&)>& body) {
     const auto guarded = [&failed, body](benchmark::State& state) {
@@ -123,6 +129,9 @@ void registerCase(const Case& one, Workbench& workbench, bool& failed) {
                           });
     };
     registerSide("/provider/", &measureProvider);
+    if (one.gated) {
+        registerSide("/gate/", &measureGate);
+    }
     registerSide("/floor/", &measureFloor);
 }
 

@@ -14,13 +14,24 @@ namespace {
     throw std::runtime_error(what + ": " + (reason != nullptr ? reason : "no reason given"));
 }
 
+/** An entrance's library and the name of its provider. */
+struct EntranceNames {
+    const char* file;
+    const char* provider;
+};
+
+EntranceNames namesOf(Entrance entrance) {
+    return entrance == Entrance::gate ? EntranceNames{BENCH_GATE_LIBRARY, "LeaseAndWarrantyGate"}
+                                      : EntranceNames{BENCH_PROVIDER_LIBRARY, "LeaseAndWarrantyProvider"};
+}
+
 template <class Interface>
-Interface* make(const SharedLibrary& library, const char* factory, const CMPIBroker* broker) {
+Interface* make(const SharedLibrary& library, const std::string& factory, const CMPIBroker* broker) {
     using Factory = Interface* (*)(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
     CMPIStatus status{CMPI_RC_OK, nullptr};
-    Interface* made = reinterpret_cast<Factory>(library.symbol(factory))(broker, nullptr, &status);
+    Interface* made = reinterpret_cast<Factory>(library.symbol(factory.c_str()))(broker, nullptr, &status);
     if (made == nullptr || status.rc != CMPI_RC_OK) {
-        throw std::runtime_error(std::string(factory) + " made nothing");
+        throw std::runtime_error(factory + " made nothing");
     }
     return made;
 }
@@ -58,9 +69,10 @@ std::filesystem::path ProviderLibrary::file() {
     return BENCH_PROVIDER_LIBRARY;
 }
 
-ProviderLibrary::ProviderLibrary(const CMPIBroker* broker) : library(file()) {
-    made.instances = make<CMPIInstanceMI>(library, "LeaseAndWarrantyProvider_Create_InstanceMI", broker);
-    made.associations = make<CMPIAssociationMI>(library, "LeaseAndWarrantyProvider_Create_AssociationMI", broker);
+ProviderLibrary::ProviderLibrary(Entrance entrance, const CMPIBroker* broker) : library(namesOf(entrance).file) {
+    const std::string provider = namesOf(entrance).provider;
+    made.instances = make<CMPIInstanceMI>(library, provider + "_Create_InstanceMI", broker);
+    made.associations = make<CMPIAssociationMI>(library, provider + "_Create_AssociationMI", broker);
 }
 
 AgentLibraries::AgentLibraries() : logging(BENCH_LOGGING_LIBRARY), framework(BENCH_FRAMEWORK_LIBRARY) {}

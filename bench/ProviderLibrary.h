@@ -25,13 +25,17 @@ private:
     void* handle;
 };
 
-/** The provider library with its two interfaces, loaded as long as this lives. */
+/** What an object manager loads: the provider, or the gate that has the provider behind it. */
+enum class Entrance { bare, gate };
+
+/** The provider library with the two interfaces of its entrance, loaded as long as this lives. */
 class ProviderLibrary {
 public:
-    explicit ProviderLibrary(const CMPIBroker* broker);
+    ProviderLibrary(Entrance entrance, const CMPIBroker* broker);
 
     Interfaces interfaces() const { return made; }
 
+    /** The file of the provider itself. */
     static std::filesystem::path file();
 
 private:

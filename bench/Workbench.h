@@ -34,19 +34,20 @@ public:
 
     /** The provider, freshly loaded with these records and none of the other class. */
     template <class Row>
-    Interfaces load(const std::vector<Row>& rows) {
+    Interfaces load(const std::vector<Row>& rows, Entrance entrance = Entrance::bare) {
         unload();
         writeRows(directory.data() / Row::fileName, rows);
-        provider.emplace(objectManager.handle());
+        provider.emplace(entrance, objectManager.handle());
         return provider->interfaces();
     }
 
     /** The provider with a table of that many records: still loaded since the last such call, or anew. */
     template <class Row>
-    Interfaces loaded(std::size_t size) {
-        const std::string wanted = Row::fileName + std::to_string(size);
+    Interfaces loaded(std::size_t size, Entrance entrance = Entrance::bare) {
+        const std::string wanted =
+            (entrance == Entrance::gate ? "gate " : "") + std::string(Row::fileName) + std::to_string(size);
         if (!provider || content != wanted) {
-            load(makeRows<Row>(size));
+            load(makeRows<Row>(size), entrance);
             content = wanted;
         }
         return provider->interfaces();

@@ -12,7 +12,9 @@ namespace {
 
 CMPIEnumeration* enumerateComputers(const Request& request) {
     const CMPIBroker& broker = *request.broker;
-    require(broker.bft != nullptr && broker.bft->enumerateInstances != nullptr, "enumerate computers");
+    if (broker.bft == nullptr || broker.bft->enumerateInstances == nullptr) {
+        fail(CMPI_RC_ERR_FAILED, "The object manager cannot enumerate computers.");
+    }
     const CMPIObjectPath* classPath = makePath(request.broker, nameSpaceOf(request.path), computerClass);
     CMPIStatus status{CMPI_RC_OK, nullptr};
     CMPIEnumeration* computers =
