@@ -22,10 +22,13 @@ bool isOrAny(const char* asked, const char* name) {
 
 /** Whether a path's class is the class or, as the object manager knows, a subclass of it. */
 bool isA(const CMPIBroker* broker, const CMPIObjectPath* path, const char* className) {
-    if (sameName(classNameOf(path), className)) {
+    const std::string pathsClass = classNameOf(path);
+    if (sameName(pathsClass, className)) {
         return true;
     }
-    if (broker->eft == nullptr || broker->eft->classPathIsA == nullptr) {
+    // The classes of the MOF do not descend from each other: the object manager need not be asked.
+    const bool areBothKnown = findClass(pathsClass) != nullptr && findClass(className) != nullptr;
+    if (areBothKnown || broker->eft == nullptr || broker->eft->classPathIsA == nullptr) {
         return false;
     }
     CMPIStatus status{CMPI_RC_OK, nullptr};

@@ -15,6 +15,9 @@ namespace {
 /** The broker of the latest factory call. */
 std::atomic<const CMPIBroker*> manager{nullptr};
 
+/** The one that the provider is connected to. */
+std::atomic<const CMPIBroker*> connected{nullptr};
+
 /**
  * Goes before the provider's own static objects, which were there first: from then on no request is let in, and none
  * is inside.
@@ -179,19 +182,29 @@ CMPIAssociationMIFT associationFunctions{
 CMPIInstanceMI instanceInterface{nullptr, &instanceFunctions};
 CMPIAssociationMI associationInterface{nullptr, &associationFunctions};
 
+/**
+ * Connects the provider to a broker, once: managers call factories again and again, maybe with a lock of theirs held,
+ * and must not have to wait for requests then.
+ */
+void connect(const CMPIBroker* broker) {
+    if (broker == nullptr) {
+        fail(CMPI_RC_ERR_INVALID_PARAMETER, "There is no broker.");
+    }
+    manager = broker;
+    if (connected.load() == broker) {
+        return;
+    }
+    const Visit visit;
+    if (!Provider::connect(broker)) {
+        fail(CMPI_RC_ERR_FAILED, "The provider behind the gate does not give its interfaces.");
+    }
+    connected = broker;
+}
+
 /** Answers an interface once the provider is connected; null, with the reason in the status, otherwise. */
 template <class Interface>
 Interface* open(const CMPIBroker* broker, CMPIStatus* rc, Interface& interface) {
-    const CMPIStatus status = guarded([&] {
-        if (broker == nullptr) {
-            fail(CMPI_RC_ERR_INVALID_PARAMETER, "There is no broker.");
-        }
-        manager = broker;
-        const Visit visit;
-        if (!Provider::connect(broker)) {
-            fail(CMPI_RC_ERR_FAILED, "The provider behind the gate does not give its interfaces.");
-        }
-    });
+    const CMPIStatus status = guarded([&] { connect(broker); });
     if (rc != nullptr) {
         *rc = status;
     }

@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <condition_variable>
+#include <cstdlib>
 #include <map>
 #include <mutex>
 #include <set>
@@ -244,6 +245,18 @@ public:
         changed.notify_all();
     }
 
+    /** Waits until somebody is inside. */
+    void awaitInside() {
+        std::unique_lock<std::mutex> lock(mutex);
+        changed.wait(lock, [&] { return inside > 0; });
+    }
+
+    /** Whether somebody is inside, or nobody ever was. */
+    bool isBusy() {
+        const std::lock_guard<std::mutex> lock(mutex);
+        return inside > 0 || most == 0;
+    }
+
     /** Inside, wait for so many threads inside (or for all to come); for what is to be shown. */
     int awaitedInside = 0;
     int awaitedComing = 0;
@@ -310,6 +323,50 @@ TEST_F(SerialisingTest, ThroughTheGateOneRequestAtATimeIsInside) {
 
 TEST_F(SerialisingTest, WithoutItAllRequestsAreInsideAtOnce) {
     load(PROVIDER_LIBRARY, "LeaseAndWarrantyProvider", clientCount);
+}
+
+TEST_F(SerialisingTest, AFactoryCallDoesNotWaitForWhoIsInside) {
+    testsupport::RecordingBroker broker;
+    InsideCounter counter(*broker.handle());
+    counter.awaitedComing = 1;
+    testsupport::ProviderLibrary library(GATE_LIBRARY, "LeaseAndWarrantyGate", broker);
+    CMPIInstanceMI* first = library.createInstanceMI(counter.handle(), nullptr);
+    std::thread request([&] { EXPECT_THAT(library.enumerateInstances(classPath(warranty)), isAnswered(1)); });
+    counter.awaitInside();
+    EXPECT_EQ(library.createInstanceMI(counter.handle(), nullptr), first);
+    counter.comes();
+    request.join();
+}
+
+/** Ends the process while a request is inside the provider; with 9 if static objects went before it. */
+struct EndWhileInside {
+    static inline InsideCounter* counter = nullptr;
+
+    static void run() {
+        // Never destroyed: the other thread uses them to the very end.
+        static auto& broker = *new testsupport::RecordingBroker;
+        static auto& inside = *new InsideCounter(*broker.handle());
+        counter = &inside;
+        inside.awaitedComing = 1;
+        // After the gate's static objects, which are not there yet.
+        std::atexit([] {
+            if (counter->isBusy()) {
+                std::_Exit(9);
+            }
+        });
+        static auto* library = new testsupport::ProviderLibrary(GATE_LIBRARY, "LeaseAndWarrantyGate", broker);
+        library->createInstanceMI(inside.handle(), nullptr);
+        // Before them.
+        std::atexit([] { counter->comes(); });
+        std::thread([] { library->enumerateInstances(classPath(warranty)); }).detach();
+        inside.awaitInside();
+        std::exit(0);
+    }
+};
+
+TEST_F(SerialisingTest, TheEndOfTheProcessWaitsForWhoIsInside) {
+    testing::FLAGS_gtest_death_test_style = "threadsafe";
+    EXPECT_EXIT(EndWhileInside::run(), testing::ExitedWithCode(0), "");
 }
 
 }  // namespace
