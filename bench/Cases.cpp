@@ -32,7 +32,7 @@ Case readCase(std::string operation, std::size_t size, Request request) {
     Case one = floorCase<Row>(std::move(operation), size, std::move(request));
     one.provider = [size](Workbench& bench) { return bench.loaded<Row>(size); };
     if (size <= largestGated) {
-        one.gated = [size](Workbench& bench) { return bench.loaded<Row>(size, Entrance::gate); };
+        one.twice = [size](Workbench& bench) { return bench.loadedTwice<Row>(size); };
     }
     return one;
 }
@@ -106,7 +106,7 @@ Case associationCase(std::string operation, std::size_t computers, Request reque
     constexpr std::size_t size = 1000;
     Case one = readCase<LeaseRow>(std::move(operation), size, std::move(request));
     one.className = "VELKO_LeaseSetting";
-    one.gated = nullptr;  // its answers are others
+    one.twice = nullptr;  // its answers are others
     one.computers = computers;
     one.floor = [](const Workbench&, const CMPIBroker* broker) {
         return makeAssociationFloor(broker, makeRows<LeaseRow>(size));

@@ -9,6 +9,7 @@
 #include <functional>
 #include <memory>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace bench {
@@ -27,8 +28,8 @@ struct Case {
     std::string changedFile{};  ///< of a request that changes records: name of the file, else empty
     std::size_t computers = 1;  ///< that the object manager knows of
 
-    /** Gives the provider behind the gate with the same table, where that is measured too: .../gate/size. */
-    std::function<Interfaces(Workbench&)> gated{};
+    /** Gives the provider alone and behind the gate, where the two are measured side by side: .../gate/size. */
+    std::function<std::pair<Interfaces, Interfaces>(Workbench&)> twice{};
 };
 
 /** The sizes of tables whose records are read, and of those that are written. */

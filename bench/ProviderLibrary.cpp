@@ -14,17 +14,6 @@ namespace {
     throw std::runtime_error(what + ": " + (reason != nullptr ? reason : "no reason given"));
 }
 
-/** An entrance's library and the name of its provider. */
-struct EntranceNames {
-    const char* file;
-    const char* provider;
-};
-
-EntranceNames namesOf(Entrance entrance) {
-    return entrance == Entrance::gate ? EntranceNames{BENCH_GATE_LIBRARY, "LeaseAndWarrantyGate"}
-                                      : EntranceNames{BENCH_PROVIDER_LIBRARY, "LeaseAndWarrantyProvider"};
-}
-
 template <class Interface>
 Interface* make(const SharedLibrary& library, const std::string& factory, const CMPIBroker* broker) {
     using Factory = Interface* (*)(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
@@ -38,9 +27,9 @@ Interface* make(const SharedLibrary& library, const std::string& factory, const 
 
 }  // namespace
 
-SharedLibrary::SharedLibrary(std::filesystem::path itsFile) : handle(dlopen(itsFile.c_str(), RTLD_NOW | RTLD_GLOBAL)) {
+SharedLibrary::SharedLibrary(const std::filesystem::path& file) : handle(dlopen(file.c_str(), RTLD_NOW | RTLD_LOCAL)) {
     if (handle == nullptr) {
-        failLoading("cannot load " + itsFile.string());
+        failLoading("cannot load " + file.string());
     }
 }
 
@@ -65,14 +54,25 @@ bool SharedLibrary::isLoaded(const std::filesystem::path& file) {
     return true;
 }
 
-std::filesystem::path ProviderLibrary::file() {
-    return BENCH_PROVIDER_LIBRARY;
+Entrance Entrance::provided() {
+    return {BENCH_PROVIDER_LIBRARY, "LeaseAndWarrantyProvider"};
 }
 
-ProviderLibrary::ProviderLibrary(Entrance entrance, const CMPIBroker* broker) : library(namesOf(entrance).file) {
-    const std::string provider = namesOf(entrance).provider;
-    made.instances = make<CMPIInstanceMI>(library, provider + "_Create_InstanceMI", broker);
-    made.associations = make<CMPIAssociationMI>(library, provider + "_Create_AssociationMI", broker);
+Entrance Entrance::gate() {
+    return {BENCH_GATE_LIBRARY, "LeaseAndWarrantyGate"};
+}
+
+Entrance Entrance::copyOf(const std::filesystem::path& directory) {
+    Entrance entrance = provided();
+    const std::filesystem::path copy = directory / entrance.file.filename();
+    std::filesystem::copy_file(entrance.file, copy, std::filesystem::copy_options::overwrite_existing);
+    entrance.file = copy;
+    return entrance;
+}
+
+ProviderLibrary::ProviderLibrary(const Entrance& entrance, const CMPIBroker* broker) : library(entrance.file) {
+    made.instances = make<CMPIInstanceMI>(library, entrance.provider + "_Create_InstanceMI", broker);
+    made.associations = make<CMPIAssociationMI>(library, entrance.provider + "_Create_AssociationMI", broker);
 }
 
 AgentLibraries::AgentLibraries() : logging(BENCH_LOGGING_LIBRARY), framework(BENCH_FRAMEWORK_LIBRARY) {}

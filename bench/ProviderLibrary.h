@@ -3,6 +3,7 @@
 #include "Requests.h"
 
 #include <filesystem>
+#include <string>
 
 namespace bench {
 
@@ -10,7 +11,7 @@ namespace bench {
 class SharedLibrary {
 public:
     /** @throws std::runtime_error with the loader's reason */
-    explicit SharedLibrary(std::filesystem::path itsFile);
+    explicit SharedLibrary(const std::filesystem::path& file);
     ~SharedLibrary();
     SharedLibrary(const SharedLibrary&) = delete;
     SharedLibrary& operator=(const SharedLibrary&) = delete;
@@ -25,18 +26,22 @@ private:
     void* handle;
 };
 
-/** What an object manager loads: the provider, or the gate that has the provider behind it. */
-enum class Entrance { bare, gate };
+/** What an object manager loads: a library, and the name of the provider that it looks for there. */
+struct Entrance {
+    std::filesystem::path file;
+    std::string provider;
 
-/** The provider library with the two interfaces of its entrance, loaded as long as this lives. */
+    static Entrance provided();                                      ///< the provider itself
+    static Entrance gate();                                          ///< the gate that has the provider behind it
+    static Entrance copyOf(const std::filesystem::path& directory);  ///< a copy of the provider, made there
+};
+
+/** The library of an entrance with its two interfaces, loaded as long as this lives. */
 class ProviderLibrary {
 public:
-    ProviderLibrary(Entrance entrance, const CMPIBroker* broker);
+    ProviderLibrary(const Entrance& entrance, const CMPIBroker* broker);
 
     Interfaces interfaces() const { return made; }
-
-    /** The file of the provider itself. */
-    static std::filesystem::path file();
 
 private:
     SharedLibrary library;

@@ -35,8 +35,9 @@ cimhost::Answer<std::vector<cimhost::Instance>> ComputerSystems::enumerateInstan
 
 void Workbench::unload() {
     provider.reset();
+    gate.reset();
     content.clear();
-    if (SharedLibrary::isLoaded(ProviderLibrary::file())) {
+    if (SharedLibrary::isLoaded(Entrance::provided().file)) {
         throw std::runtime_error("the provider library stays in the process");
     }
     directory.removeRecords();

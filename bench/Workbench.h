@@ -10,6 +10,7 @@
 #include <cstddef>
 #include <optional>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace bench {
@@ -34,23 +35,36 @@ public:
 
     /** The provider, freshly loaded with these records and none of the other class. */
     template <class Row>
-    Interfaces load(const std::vector<Row>& rows, Entrance entrance = Entrance::bare) {
+    Interfaces load(const std::vector<Row>& rows) {
         unload();
         writeRows(directory.data() / Row::fileName, rows);
-        provider.emplace(entrance, objectManager.handle());
+        provider.emplace(Entrance::provided(), objectManager.handle());
         return provider->interfaces();
     }
 
     /** The provider with a table of that many records: still loaded since the last such call, or anew. */
     template <class Row>
-    Interfaces loaded(std::size_t size, Entrance entrance = Entrance::bare) {
-        const std::string wanted =
-            (entrance == Entrance::gate ? "gate " : "") + std::string(Row::fileName) + std::to_string(size);
+    Interfaces loaded(std::size_t size) {
+        const std::string wanted = Row::fileName + std::to_string(size);
         if (!provider || content != wanted) {
-            load(makeRows<Row>(size), entrance);
+            load(makeRows<Row>(size));
             content = wanted;
         }
         return provider->interfaces();
+    }
+
+    /** The same table twice, in two copies of the provider: the first alone, the second behind the gate. */
+    template <class Row>
+    std::pair<Interfaces, Interfaces> loadedTwice(std::size_t size) {
+        const std::string wanted = std::string("twice ") + Row::fileName + std::to_string(size);
+        if (!gate || content != wanted) {
+            unload();
+            writeRows(directory.data() / Row::fileName, makeRows<Row>(size));
+            gate.emplace(Entrance::gate(), objectManager.handle());  // first: what it needs is found by its name
+            provider.emplace(Entrance::copyOf(directory.data()), objectManager.handle());
+            content = wanted;
+        }
+        return {provider->interfaces(), gate->interfaces()};
     }
 
     /** Takes the provider out of the process and its records away. */
@@ -62,6 +76,7 @@ private:
     ComputerSystems upCalls{};
     cimhost::Broker objectManager{{{}, &upCalls, {}, nullptr}};
     std::optional<ProviderLibrary> provider{};
+    std::optional<ProviderLibrary> gate{};
     std::string content{};  ///< what loaded() has loaded; empty when a request may have changed it
 };
 
