@@ -20,5 +20,5 @@ else()
 endif()
 
 add_library(law_cmpi INTERFACE)
-target_include_directories(law_cmpi SYSTEM INTERFACE ${cmpi_headers})
+target_include_directories(law_cmpi SYSTEM INTERFACE $<BUILD_INTERFACE:${cmpi_headers}>)
 target_compile_definitions(law_cmpi INTERFACE CMPI_PLATFORM_LINUX_GENERIC_GNU CMPI_VERSION=200)

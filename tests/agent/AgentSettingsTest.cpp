@@ -1,5 +1,6 @@
 #include "framework/AgentSettings.h"
 
+#include "agent/ShippedConfiguration.h"
 #include "configuration/FileContent.h"
 
 #include <gmock/gmock.h>
@@ -36,6 +37,22 @@ TEST_F(AgentSettingsTest, HaveDefaults) {
     EXPECT_EQ(settings.dmiRoot, "/sys/class/dmi/id/");
     EXPECT_TRUE(settings.discover);
     EXPECT_THAT(settings.nodes, IsEmpty());
+    EXPECT_THAT(problems, IsEmpty());
+}
+
+TEST_F(AgentSettingsTest, HaveTheDefaultsThatTheInstalledFileShows) {
+    const AgentSettings defaults = read("");
+    const AgentSettings shown = read(shippedConfiguration().c_str());
+    EXPECT_EQ(shown.installDirectory, defaults.installDirectory);
+    EXPECT_EQ(shown.dataDirectory, defaults.dataDirectory);
+    EXPECT_EQ(shown.product.name, defaults.product.name);
+    EXPECT_EQ(shown.product.version, defaults.product.version);
+    EXPECT_EQ(shown.product.buildNumber, defaults.product.buildNumber);
+    EXPECT_EQ(shown.product.vendor, defaults.product.vendor);
+    EXPECT_EQ(shown.dmiRoot, defaults.dmiRoot);
+    EXPECT_EQ(shown.discover, defaults.discover);
+    EXPECT_THAT(shown.nodes, IsEmpty());
+    EXPECT_THAT(shown.flags, ElementsAre(Pair("gate.refuse_lossy_values", true)));
     EXPECT_THAT(problems, IsEmpty());
 }
 

@@ -1,5 +1,7 @@
 #include "logging/LogSettings.h"
 
+#include "agent/ShippedConfiguration.h"
+
 #include <gmock/gmock.h>
 
 using RZLog::Channel;
@@ -29,6 +31,18 @@ TEST_F(LogSettingsTest, HaveDefaults) {
     EXPECT_EQ(settings.rotationCount, 5U);
     EXPECT_TRUE(settings.levels.admit(Channel::log, "any", 3000));
     EXPECT_FALSE(settings.levels.admit(Channel::trace, "any", 4000));
+    EXPECT_THAT(problems, IsEmpty());
+}
+
+TEST_F(LogSettingsTest, HaveTheDefaultsThatTheInstalledFileShows) {
+    const LogSettings shown = read(shippedConfiguration().c_str());
+    EXPECT_EQ(shown.destination, LogSettings::Destination::none);
+    EXPECT_EQ(shown.rotationSize, 10485760U);
+    EXPECT_EQ(shown.rotationCount, 5U);
+    for (const Channel channel : {Channel::log, Channel::trace}) {
+        EXPECT_TRUE(shown.levels.admit(channel, "any", 3000));
+        EXPECT_FALSE(shown.levels.admit(channel, "any", 4000));
+    }
     EXPECT_THAT(problems, IsEmpty());
 }
 

@@ -5,6 +5,7 @@
 #include <algorithm>
 
 #include "schema/MofWriter.h"
+#include "support/UnderTest.h"
 
 /** Two computers, told apart by name and place. */
 const char* const agentNodes = R"(
@@ -131,15 +132,16 @@ GateTest::~GateTest() {
 
 testsupport::ProviderLibrary& GateTest::gate() {
     if (library == nullptr) {
-        library = std::make_unique<testsupport::ProviderLibrary>(GATE_LIBRARY, "LeaseAndWarrantyGate", broker);
+        library = std::make_unique<testsupport::ProviderLibrary>(testsupport::underTest(GATE_LIBRARY),
+                                                                 "LeaseAndWarrantyGate", broker);
     }
     return *library;
 }
 
 void GateTest::unload() {
     library.reset();
-    EXPECT_FALSE(isLoaded(GATE_LIBRARY)) << "the gate stays in the process";
-    EXPECT_FALSE(isLoaded(PROVIDER_LIBRARY)) << "the provider stays in the process";
+    EXPECT_FALSE(isLoaded(testsupport::underTest(GATE_LIBRARY))) << "the gate stays in the process";
+    EXPECT_FALSE(isLoaded(testsupport::underTest(PROVIDER_LIBRARY))) << "the provider stays in the process";
 }
 
 Outcome GateTest::create(const std::string& id, std::vector<NamedValue> properties, const std::string& of) {

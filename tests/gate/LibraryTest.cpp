@@ -3,6 +3,8 @@
 #include <cstdio>
 #include <memory>
 
+#include "support/UnderTest.h"
+
 // The built library as a file, its factories, its coming and going.
 
 namespace gatetest {
@@ -23,23 +25,27 @@ std::string outputOf(const std::string& command) {
     return output;
 }
 
+std::string gateFile() {
+    return testsupport::underTest(GATE_LIBRARY);
+}
+
 using LibraryTest = GateTest;
 
 TEST_F(LibraryTest, ExportsExactlyTheTwoFactories) {
-    EXPECT_EQ(outputOf("nm --dynamic --defined-only --format=posix " GATE_LIBRARY " | cut -d' ' -f1,2 | sort"),
+    EXPECT_EQ(outputOf("nm --dynamic --defined-only --format=posix " + gateFile() + " | cut -d' ' -f1,2 | sort"),
               "LeaseAndWarrantyGate_Create_AssociationMI T\nLeaseAndWarrantyGate_Create_InstanceMI T\n");
 }
 
 TEST_F(LibraryTest, FindsTheProviderBesideItself) {
-    EXPECT_THAT(outputOf("readelf --dynamic " GATE_LIBRARY),
-                AllOf(HasSubstr("[libLeaseAndWarrantyProvider.so]"), HasSubstr("[$ORIGIN]")));
+    EXPECT_THAT(outputOf("readelf --dynamic " + gateFile()),
+                AllOf(HasSubstr("[libLeaseAndWarrantyProvider.so]"), HasSubstr("[$ORIGIN")));
 }
 
 TEST_F(LibraryTest, LeavesNoSymbolOpen) {
-    const std::string relocations = outputOf("LD_PRELOAD= ldd -r " GATE_LIBRARY);
+    const std::string relocations = outputOf("LD_PRELOAD= ldd -r " + gateFile());
     EXPECT_THAT(relocations, HasSubstr("libLeaseAndWarrantyProvider.so =>"));
     // A build with sanitizers finds their functions in the program.
-    if (outputOf("nm --dynamic " GATE_LIBRARY).find("san_init") == std::string::npos) {
+    if (outputOf("nm --dynamic " + gateFile()).find("san_init") == std::string::npos) {
         EXPECT_THAT(relocations, Not(HasSubstr("undefined symbol")));
     }
     EXPECT_THAT(relocations, Not(HasSubstr("not found")));

@@ -9,6 +9,7 @@
 #include <sstream>
 
 #include "host/schema/Schemas.h"
+#include "support/UnderTest.h"
 
 namespace cimhost::test {
 namespace {
@@ -56,8 +57,9 @@ Ended runBare(const std::vector<std::string>& arguments, const Environment& envi
     const TemporaryDirectory directory;
     const std::string output = outputFile.empty() ? (directory.path / "output").string() : outputFile;
     const std::string error = directory.path / "error";
+    const std::string program = testsupport::underTest(CIMHOST_PROGRAM);
     std::vector<std::string> words = arguments;
-    words.insert(words.begin(), CIMHOST_PROGRAM);
+    words.insert(words.begin(), program);
     std::vector<std::string> variables = environmentWith(environment);
     const std::vector<char*> wordPointers = pointersTo(words);
     const std::vector<char*> variablePointers = pointersTo(variables);
@@ -65,7 +67,7 @@ Ended runBare(const std::vector<std::string>& arguments, const Environment& envi
     if (child == 0) {
         redirect(output, STDOUT_FILENO);
         redirect(error, STDERR_FILENO);
-        execve(CIMHOST_PROGRAM, wordPointers.data(), variablePointers.data());
+        execve(program.c_str(), wordPointers.data(), variablePointers.data());
         _exit(126);
     }
     int status = 0;

@@ -1,6 +1,7 @@
 #include "RecordFixture.h"
 
 #include "support/Files.h"
+#include "support/UnderTest.h"
 
 #include <dlfcn.h>
 #include <elf.h>
@@ -21,6 +22,10 @@ using testing::HasSubstr;
 using testing::Not;
 using testing::UnorderedElementsAre;
 using testsupport::readFile;
+
+std::string libraryFile() {
+    return testsupport::underTest(PROVIDER_LIBRARY);
+}
 
 /** A symbol of a library's dynamic symbol table. */
 struct DynamicSymbol {
@@ -61,7 +66,7 @@ std::vector<DynamicSymbol> dynamicSymbols(const std::string& file) {
 
 TEST(LibraryFileTest, ExportsExactlyTheTwoFactories) {
     std::vector<std::string> exported;
-    for (const DynamicSymbol& symbol : dynamicSymbols(PROVIDER_LIBRARY)) {
+    for (const DynamicSymbol& symbol : dynamicSymbols(libraryFile())) {
         if (symbol.isDefined && symbol.binding != STB_LOCAL) {
             exported.push_back(symbol.name);
             EXPECT_EQ(symbol.visibility, STV_DEFAULT) << symbol.name;
@@ -72,7 +77,7 @@ TEST(LibraryFileTest, ExportsExactlyTheTwoFactories) {
 }
 
 TEST(LibraryFileTest, HasNoSymbolThatKeepsItInTheProcess) {
-    for (const DynamicSymbol& symbol : dynamicSymbols(PROVIDER_LIBRARY)) {
+    for (const DynamicSymbol& symbol : dynamicSymbols(libraryFile())) {
         EXPECT_NE(symbol.binding, STB_GNU_UNIQUE) << symbol.name;
     }
 }
@@ -91,7 +96,7 @@ std::string outputOf(const std::string& command) {
 
 TEST(LibraryFileTest, LeavesNoSymbolUnresolved) {
     // The functions of a sanitizer's runtime are in the program, not in the libraries.
-    const std::string output = outputOf("ldd -r '" PROVIDER_LIBRARY
+    const std::string output = outputOf("ldd -r '" + libraryFile() +
                                         "' 2>&1 | grep -Ev 'undefined symbol: __(asan|lsan|tsan|ubsan|sanitizer)_'");
     EXPECT_THAT(output, HasSubstr("libkoframework.so"));
     EXPECT_THAT(output, HasSubstr("librzlog.so"));
@@ -103,7 +108,7 @@ class LoadingTest : public RecordTest {
 protected:
     /** The identifiers of all records, by a library loaded with these flags and closed again. */
     std::vector<std::string> identifiersThrough(int flags) {
-        testsupport::ProviderLibrary own(PROVIDER_LIBRARY, "LeaseAndWarrantyProvider", broker, flags);
+        testsupport::ProviderLibrary own(libraryFile(), "LeaseAndWarrantyProvider", broker, flags);
         return identifiersOf(own.enumerateInstanceNames(allPath()).paths());
     }
 };

@@ -3,6 +3,7 @@
 #include "schema/Literal.h"
 #include "schema/MofWriter.h"
 #include "support/Files.h"
+#include "support/UnderTest.h"
 
 #include <dlfcn.h>
 
@@ -125,7 +126,8 @@ ProviderTest::~ProviderTest() {
 
 testsupport::ProviderLibrary& ProviderTest::provider() {
     if (library == nullptr) {
-        library = std::make_unique<testsupport::ProviderLibrary>(PROVIDER_LIBRARY, providerName, broker);
+        library = std::make_unique<testsupport::ProviderLibrary>(testsupport::underTest(PROVIDER_LIBRARY), providerName,
+                                                                 broker);
     }
     return *library;
 }
@@ -136,7 +138,7 @@ void ProviderTest::unload() {
 }
 
 bool ProviderTest::isLoaded() {
-    void* handle = dlopen(PROVIDER_LIBRARY, RTLD_LAZY | RTLD_NOLOAD);
+    void* handle = dlopen(testsupport::underTest(PROVIDER_LIBRARY).c_str(), RTLD_LAZY | RTLD_NOLOAD);
     if (handle != nullptr) {
         dlclose(handle);
     }
