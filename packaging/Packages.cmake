@@ -1,0 +1,94 @@
+# The Debian packages, one a component. Included last: it packs what everything else installs.
+set(CPACK_GENERATOR DEB)
+set(CPACK_SET_DESTDIR ON)
+set(CPACK_INSTALL_PREFIX ${CMAKE_INSTALL_PREFIX})
+set(CPACK_STRIP_FILES ON)
+set(CPACK_VERBATIM_VARIABLES ON)
+set(CPACK_PACKAGE_VERSION ${PROJECT_VERSION})
+set(CPACK_PACKAGE_DIRECTORY ${PROJECT_BINARY_DIR}/packages)
+set(CPACK_PACKAGE_CONTACT "Lease and Warranty Provider developers <developers@lease-warranty-provider.example>")
+# Each package has a summary of its own.
+set(CPACK_PACKAGE_DESCRIPTION_SUMMARY "")
+set(CPACK_COMPONENTS_ALL provider agent host development)
+set(CPACK_DEB_COMPONENT_INSTALL ON)
+set(CPACK_DEBIAN_PACKAGE_RELEASE 1)
+set(CPACK_DEBIAN_FILE_NAME DEB-DEFAULT)
+set(CPACK_DEBIAN_PACKAGE_SECTION admin)
+set(CPACK_DEBIAN_PACKAGE_CONTROL_STRICT_PERMISSION ON)
+# What the libraries of other packages ask for is found out; those of the agent are not installed where this is run.
+set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS ON)
+set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS_PRIVATE_DIRS ${CMAKE_LIBRARY_OUTPUT_DIRECTORY})
+
+set(debian ${CMAKE_CURRENT_LIST_DIR}/debian)
+
+# law_package(<component> <name> DESCRIPTION <summary and lines> [DEPENDS <packages>] [SECTION <section>])
+# What the package of a component is called and says of itself. Its control files are in debian/<component>; every
+# package has copyright and changes, and says why it is not as lintian wants it.
+macro(law_package component name)
+    cmake_parse_arguments(arg "" "DESCRIPTION;DEPENDS;SECTION" "" ${ARGN})
+    string(TOUPPER ${component} key)
+    set(CPACK_DEBIAN_${key}_PACKAGE_NAME ${name})
+    set(CPACK_DEBIAN_${key}_DESCRIPTION "${arg_DESCRIPTION}")
+    set(CPACK_DEBIAN_${key}_PACKAGE_DEPENDS "${arg_DEPENDS}")
+    if(arg_SECTION)
+        set(CPACK_DEBIAN_${key}_PACKAGE_SECTION ${arg_SECTION})
+    endif()
+    file(GLOB CPACK_DEBIAN_${key}_PACKAGE_CONTROL_EXTRA CONFIGURE_DEPENDS ${debian}/${component}/*)
+    list(REMOVE_ITEM CPACK_DEBIAN_${key}_PACKAGE_CONTROL_EXTRA ${debian}/${component}/lintian-overrides)
+
+    set(documents ${CMAKE_INSTALL_DATADIR}/doc/${name})
+    install(FILES ${debian}/copyright DESTINATION ${documents} COMPONENT ${component})
+    law_install_compressed(${PROJECT_SOURCE_DIR}/CHANGELOG.md changelog.gz ${documents} ${component})
+    law_install_compressed(${debian}/changelog changelog.Debian.gz ${documents} ${component})
+    law_install_overrides(${component} ${name})
+endmacro()
+
+# law_install_overrides(<component> <name>)
+# Those of the component, after those that all packages have.
+function(law_install_overrides component name)
+    set(overrides ${CMAKE_CURRENT_BINARY_DIR}/overrides/${name})
+    configure_file(${debian}/lintian-overrides.in ${overrides} @ONLY)
+    if(EXISTS ${debian}/${component}/lintian-overrides)
+        file(READ ${debian}/${component}/lintian-overrides own)
+        file(APPEND ${overrides} "${own}")
+    endif()
+    install(FILES ${overrides} DESTINATION ${CMAKE_INSTALL_DATADIR}/lintian/overrides COMPONENT ${component})
+endfunction()
+
+law_package(provider lease-warranty-provider
+    DEPENDS "ostrel-reference-agent (>= ${PROJECT_VERSION}) | ostrel-agent"
+    DESCRIPTION "CMPI provider for the leases and warranties of a computer
+A library that a CIM object manager (SFCB, OpenPegasus) loads, and that
+serves the leases and warranties under which a computer is held, the
+computer's asset identification and the identity of its management agent.
+
+With it comes a gate that lets one request at a time through and answers as
+the CIM standard has it, and the command lease-warranty-register, which
+registers the classes with the object manager.")
+set(CPACK_DEBIAN_PROVIDER_PACKAGE_SUGGESTS cimhost)
+
+law_package(agent ostrel-reference-agent
+    DESCRIPTION "framework and logging library of a management agent
+The libraries that the CMPI provider for leases and warranties stands on, and
+a CMPI provider of the computer that they belong to. They read the real
+machine: host name, vendor and model.
+
+Another agent's libraries with the same declarations can take their place.")
+set(CPACK_DEBIAN_AGENT_PACKAGE_PROVIDES ostrel-agent)
+
+law_package(host cimhost
+    DESCRIPTION "runs CMPI providers without an object manager
+A small object manager for the command line: it loads a CMPI provider, sends
+it one request, shows the answer for people or as JSON or MOF, and ends. It
+knows classes from MOF files and providers from registrations in SFCB's form.")
+set(CPACK_DEBIAN_HOST_PACKAGE_SUGGESTS lease-warranty-provider)
+
+set(version "${PROJECT_VERSION}-${CPACK_DEBIAN_PACKAGE_RELEASE}")
+law_package(development lease-warranty-provider-dev
+    SECTION libdevel
+    DEPENDS "ostrel-reference-agent (= ${version}), cimhost (= ${version})"
+    DESCRIPTION "headers to build CMPI providers with
+The CMPI 2.0 headers, the declarations of the agent's framework and logging
+library, and what CMake and pkg-config need to find them.")
+
+include(CPack)
