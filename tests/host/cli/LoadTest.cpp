@@ -28,9 +28,10 @@ TEST(LoadCommand, ReportsFiguresAndSucceedsWhenNoAnswerIsWrong) {
     const Ended ended = runDepot({"load", "Depot_Thing", "--clients", "4", "--requests", "400"});
     EXPECT_EQ(ended.status, 0);
     EXPECT_EQ(ended.error, "");
-    EXPECT_THAT(ended.output, AllOf(HasSubstr("4 clients, 400 requests, manager standard, seed 1: "),
-                                    HasSubstr("requests  wrong  per second  p50 us  p95 us  p99 us  max us"),
-                                    HasSubstr("\nall "), HasSubstr("no answer was wrong\n")));
+    EXPECT_THAT(ended.output,
+                AllOf(HasSubstr("4 clients, 400 requests, manager standard, seed 1: "),
+                      testing::ContainsRegex("requests +wrong +per second +p50 us +p95 us +p99 us +max us\n"),
+                      HasSubstr("\nall "), HasSubstr("no answer was wrong\n")));
 }
 
 TEST(LoadCommand, TellsWrongAnswersInWordsAndFails) {
