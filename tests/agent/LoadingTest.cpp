@@ -73,7 +73,8 @@ std::vector<Symbol> exportsOf(const std::string& library) {
         const auto* entries = content.at<Elf64_Sym>(sections[section].sh_offset);
         for (std::size_t entry = 0; entry < sections[section].sh_size / sizeof(Elf64_Sym); ++entry) {
             if (entries[entry].st_shndx != SHN_UNDEF && entries[entry].st_shndx != SHN_ABS) {
-                symbols.push_back({demangled(names + entries[entry].st_name), static_cast<unsigned char>(ELF64_ST_BIND(entries[entry].st_info))});
+                symbols.push_back({demangled(names + entries[entry].st_name),
+                                   static_cast<unsigned char>(ELF64_ST_BIND(entries[entry].st_info))});
             }
         }
     }
