@@ -115,6 +115,7 @@ void joinKeys(Request& request, const Schema& schema) {
 
 std::vector<std::string> namesOf(const std::vector<NamedValue>& values) {
     std::vector<std::string> names;
+    names.reserve(values.size());
     for (const NamedValue& each : values) {
         names.push_back(each.name);
     }

@@ -84,6 +84,7 @@ Status statusOf(const RawAnswer& answer, Operation operation) {
 
 Status statusOf(const std::vector<RawAnswer>& answers, Operation operation) {
     std::vector<Status> all;
+    all.reserve(answers.size());
     for (const RawAnswer& answer : answers) {
         all.push_back(statusOf(answer, operation));
     }
