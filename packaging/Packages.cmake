@@ -21,11 +21,13 @@ set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS_PRIVATE_DIRS ${CMAKE_LIBRARY_OUTPUT_DIRECTORY
 
 set(debian ${CMAKE_CURRENT_LIST_DIR}/debian)
 
-# law_package(<component> <name> DESCRIPTION <summary and lines> [DEPENDS <packages>] [SECTION <section>])
-# What the package of a component is called and says of itself. Its control files are in debian/<component>; every
-# package has copyright and changes, and says why it is not as lintian wants it.
+# law_package(<component> <name> DESCRIPTION <summary and lines> [DEPENDS <packages>] [SECTION <section>]
+#             [DOCUMENTS <names>])
+# What the package of a component is called and says of itself, and which files and directories of docs/ it brings. Its
+# control files are in debian/<component>; every package has copyright and changes, and says why it is not as lintian
+# wants it.
 macro(law_package component name)
-    cmake_parse_arguments(arg "" "DESCRIPTION;DEPENDS;SECTION" "" ${ARGN})
+    cmake_parse_arguments(arg "" "DESCRIPTION;DEPENDS;SECTION" "DOCUMENTS" ${ARGN})
     string(TOUPPER ${component} key)
     set(CPACK_DEBIAN_${key}_PACKAGE_NAME ${name})
     set(CPACK_DEBIAN_${key}_DESCRIPTION "${arg_DESCRIPTION}")
@@ -38,10 +40,23 @@ macro(law_package component name)
 
     set(documents ${CMAKE_INSTALL_DATADIR}/doc/${name})
     install(FILES ${debian}/copyright DESTINATION ${documents} COMPONENT ${component})
+    foreach(document IN LISTS arg_DOCUMENTS)
+        law_install_document(${document} ${documents} ${component})
+    endforeach()
     law_install_compressed(${PROJECT_SOURCE_DIR}/CHANGELOG.md changelog.gz ${documents} ${component})
     law_install_compressed(${debian}/changelog changelog.Debian.gz ${documents} ${component})
     law_install_overrides(${component} ${name})
 endmacro()
+
+# law_install_document(<name> <directory> <component>)
+function(law_install_document name directory component)
+    set(document ${PROJECT_SOURCE_DIR}/docs/${name})
+    if(IS_DIRECTORY ${document})
+        install(DIRECTORY ${document} DESTINATION ${directory} COMPONENT ${component})
+    else()
+        install(FILES ${document} DESTINATION ${directory} COMPONENT ${component})
+    endif()
+endfunction()
 
 # law_install_overrides(<component> <name>)
 # Those of the component, after those that all packages have.
@@ -56,6 +71,7 @@ function(law_install_overrides component name)
 endfunction()
 
 law_package(provider lease-warranty-provider
+    DOCUMENTS classes classes.md data-files.md gate.md log-records.md
     DEPENDS "ostrel-reference-agent (>= ${PROJECT_VERSION}) | ostrel-agent"
     DESCRIPTION "CMPI provider for the leases and warranties of a computer
 A library that a CIM object manager (SFCB, OpenPegasus) loads, and that
@@ -68,6 +84,7 @@ registers the classes with the object manager.")
 set(CPACK_DEBIAN_PROVIDER_PACKAGE_SUGGESTS cimhost)
 
 law_package(agent ostrel-reference-agent
+    DOCUMENTS agent.md
     DESCRIPTION "framework and logging library of a management agent
 The libraries that the CMPI provider for leases and warranties stands on, and
 a CMPI provider of the computer that they belong to. They read the real
@@ -77,6 +94,7 @@ Another agent's libraries with the same declarations can take their place.")
 set(CPACK_DEBIAN_AGENT_PACKAGE_PROVIDES ostrel-agent)
 
 law_package(host cimhost
+    DOCUMENTS cimhost.md
     DESCRIPTION "runs CMPI providers without an object manager
 A small object manager for the command line: it loads a CMPI provider, sends
 it one request, shows the answer for people or as JSON or MOF, and ends. It
