@@ -1,0 +1,35 @@
+"""Finds texts for people among the literals of C++ sources."""
+
+import re
+
+from pages import ROOT
+
+TOKEN = re.compile(r'//[^\n]*|/\*.*?\*/|#include[^\n]*|static_assert\([^;]*;|\'(?:\\.|[^\'\\\n])\'|"(?:\\.|[^"\\\n])*"', re.S)
+ESCAPES = {"n": "\n", "t": "\t", "0": "\0"}
+
+
+def files(*folders):
+    found = [path for folder in folders for path in sorted((ROOT / folder).rglob("*"))]
+    return [path for path in found if path.suffix in (".cpp", ".h")]
+
+
+def literals(text):
+    """The literals of a source in their order, those that stand together as one."""
+    found, end = [], None
+    for token in TOKEN.finditer(text):
+        if not token[0].startswith('"'):
+            continue
+        value = re.sub(r"\\(.)", lambda escape: ESCAPES.get(escape[1], escape[1]), token[0][1:-1])
+        if end is not None and not text[end:token.start()].strip():
+            found[-1] += value
+        else:
+            found.append(value)
+        end = token.end()
+    return found
+
+
+def is_prose(text):
+    """Several words, or a part of a sentence that something else goes before or after. A trace's label is none."""
+    several = re.search(r"[A-Za-z][,.;:)'\"]* +[(\"']?[A-Za-z]", text)
+    part = re.search(r"^ .*[A-Za-z]|[A-Za-z].* $", text)
+    return bool(several or part) and not re.fullmatch(r" \w+=?", text)
