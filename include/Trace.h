@@ -57,12 +57,21 @@ inline CallSite here(const CallSite& caller, unsigned int line = __builtin_LINE(
 
 namespace {
 
+/** Whether somebody may read a line of the site. A logging library that cannot tell is given every line. */
+inline bool isWanted(const CallSite& site) noexcept {
+    using RZLog::RZLogger;
+    return RZLogger::admits == nullptr || RZLogger::admits(site.unit->logger, site.level);
+}
+
 /**
  * Writes one line to both channels. The text is formatted anew for each: the buffer that it stands
  * in belongs to nobody between two calls. A line that memory cannot hold is lost, never the request.
  */
 template <class Format>
 void writeLine(const CallSite& site, Format format) noexcept {
+    if (!isWanted(site)) {
+        return;
+    }
     try {
         const char* file = site.unit->file;
         const int line = static_cast<int>(site.line);
@@ -99,6 +108,9 @@ std::string parameterList(const Parts&... parts) {
 /** Writes one line of a kind, with a parameter list if there are parts. */
 template <class... Parts>
 void traceLine(const CallSite& site, MessageType type, const Parts&... parts) noexcept {
+    if (!isWanted(site)) {
+        return;
+    }
     if constexpr (sizeof...(Parts) == 0) {
         writeLine(site, [&] { return trace(site.function, site.unit->file, site.line, type); });
     } else {
@@ -121,12 +133,15 @@ class Traced {
 public:
     template <class... Arguments>
     explicit Traced(const CallSite& callSite, Arguments&&... arguments)
-        : site(callSite), parts(std::forward<Arguments>(arguments)...), exceptions(std::uncaught_exceptions()) {
-        write(MT_ENTERING);
+        : site(callSite), parts(std::forward<Arguments>(arguments)...) {
+        if (isWanted(site)) {
+            exceptions = std::uncaught_exceptions();
+            write(MT_ENTERING);
+        }
     }
 
     ~Traced() {
-        if (std::uncaught_exceptions() == exceptions) {
+        if (exceptions != unwanted && std::uncaught_exceptions() == exceptions) {
             write(MT_EXITING);
         }
     }
@@ -139,9 +154,11 @@ private:
         std::apply([&](const auto&... part) { traceLine(site, type, part...); }, parts);
     }
 
+    static constexpr int unwanted = -1;
+
     CallSite site;
     std::tuple<Parts...> parts;
-    int exceptions;
+    int exceptions = unwanted;  ///< how many were leaving at the entry
 };
 
 /** Variables are referred to; what exists only in the call is kept. */

@@ -1,8 +1,10 @@
 #pragma once
 
-#include <cstdarg>
-#include <cstdio>
+#include <algorithm>
+#include <charconv>
+#include <cstddef>
 #include <cstring>
+#include <limits>
 
 /**
  * The texts of trace lines. Each formatting function owns one buffer, shared by all its calls: a
@@ -22,14 +24,44 @@ enum MessageType : int {
 
 constexpr std::size_t traceBufferSize = 512;
 
-/** Clears the buffer and formats into it. @return the buffer */
-[[maybe_unused]] __attribute__((format(printf, 2, 3))) static char* formatTrace(char (&buffer)[traceBufferSize],
-                                                                                const char* format, ...) {
-    std::memset(buffer, 0, traceBufferSize);
-    std::va_list arguments;
-    va_start(arguments, format);
-    std::vsnprintf(buffer, traceBufferSize, format, arguments);
-    va_end(arguments);
+/**
+ * A text in a buffer of its own size, which is cleared first and cut where the buffer ends. Lines are made
+ * in great numbers, hence without sprintf.
+ */
+class TraceText {
+public:
+    explicit TraceText(char (&buffer)[traceBufferSize]) : place(buffer), end(buffer + traceBufferSize - 1) {
+        std::memset(buffer, 0, traceBufferSize);
+    }
+
+    void append(const char* text) {
+        const char* shownText = text != nullptr ? text : "(null)";
+        append(shownText, std::strlen(shownText));
+    }
+
+    /** A number counts as signed, so the highest ones are shown as negative. */
+    void append(unsigned int number) {
+        char digits[std::numeric_limits<int>::digits10 + 2];
+        append(digits, static_cast<std::size_t>(
+                           std::to_chars(digits, digits + sizeof digits, static_cast<int>(number)).ptr - digits));
+    }
+
+private:
+    void append(const char* text, std::size_t length) {
+        const std::size_t taken = std::min(length, static_cast<std::size_t>(end - place));
+        std::memcpy(place, text, taken);
+        place += taken;
+    }
+
+    char* place;
+    char* end;
+};
+
+/** Puts texts and numbers together in the buffer. @return the buffer */
+template <class... Parts>
+static char* formatTrace(char (&buffer)[traceBufferSize], Parts... parts) {
+    TraceText text(buffer);
+    (text.append(parts), ...);
     return buffer;
 }
 
@@ -39,16 +71,15 @@ constexpr std::size_t traceBufferSize = 512;
  */
 [[maybe_unused]] static char* trace(const char* function, const char* file, unsigned int line, MessageType type) {
     static char buffer[traceBufferSize];
-    const int lineNumber = static_cast<int>(line);
     switch (type) {
         case MT_EXITING:
-            return formatTrace(buffer, "EXITING: %s() in %s [Line: %d]", function, file, lineNumber);
+            return formatTrace(buffer, "EXITING: ", function, "() in ", file, " [Line: ", line, "]");
         case MT_METHOD:
-            return formatTrace(buffer, "METHOD: %s() was invoked in %s [Line: %d]", function, file, lineNumber);
+            return formatTrace(buffer, "METHOD: ", function, "() was invoked in ", file, " [Line: ", line, "]");
         case MT_MESSAGE:
-            return formatTrace(buffer, "MESSAGE [File: %s, Line: %d]: %s", file, lineNumber, function);
+            return formatTrace(buffer, "MESSAGE [File: ", file, ", Line: ", line, "]: ", function);
         default:
-            return formatTrace(buffer, "ENTERING: %s() in %s [Line: %d]", function, file, lineNumber);
+            return formatTrace(buffer, "ENTERING: ", function, "() in ", file, " [Line: ", line, "]");
     }
 }
 
@@ -56,35 +87,31 @@ constexpr std::size_t traceBufferSize = 512;
 [[maybe_unused]] static char* tracepara(const char* function, const char* file, unsigned int line,
                                         const char* parameters, MessageType type) {
     static char buffer[traceBufferSize];
-    const int lineNumber = static_cast<int>(line);
+    constexpr const char* lineEnd = "],Parameters List: ";
     switch (type) {
         case MT_EXITING:
-            return formatTrace(buffer, "EXITING: %s() in %s [Line: %d],Parameters List: %s", function, file, lineNumber,
-                               parameters);
+            return formatTrace(buffer, "EXITING: ", function, "() in ", file, " [Line: ", line, lineEnd, parameters);
         case MT_METHOD:
-            return formatTrace(buffer, "METHOD: %s() was invoked in %s [Line: %d],Parameters List: %s", function, file,
-                               lineNumber, parameters);
+            return formatTrace(buffer, "METHOD: ", function, "() was invoked in ", file, " [Line: ", line, lineEnd,
+                               parameters);
         case MT_MESSAGE:
-            return formatTrace(buffer, "MESSAGE [File: %s, Line: %d]: %s,Parameters List: %s", file, lineNumber,
-                               function, parameters);
+            return formatTrace(buffer, "MESSAGE [File: ", file, ", Line: ", line, "]: ", function,
+                               ",Parameters List: ", parameters);
         default:
-            return formatTrace(buffer, "ENTERING: %s() in %s [Line: %d],Parameters List: %s", function, file,
-                               lineNumber, parameters);
+            return formatTrace(buffer, "ENTERING: ", function, "() in ", file, " [Line: ", line, lineEnd, parameters);
     }
 }
 
 /** The line that tells a text variable's value. */
 [[maybe_unused]] static char* trace(const char* name, const char* file, unsigned int line, const char* value) {
     static char buffer[traceBufferSize];
-    return formatTrace(buffer, "VARIABLE: '%s' has Value '%s' at line %d in %s", name, value, static_cast<int>(line),
-                       file);
+    return formatTrace(buffer, "VARIABLE: '", name, "' has Value '", value, "' at line ", line, " in ", file);
 }
 
 /** The line that tells a number's value. */
 [[maybe_unused]] static char* trace(const char* name, const char* file, unsigned int line, unsigned int value) {
     static char buffer[traceBufferSize];
-    return formatTrace(buffer, "VARIABLE: '%s' has Value '%d' at line %d in %s", name, static_cast<int>(value),
-                       static_cast<int>(line), file);
+    return formatTrace(buffer, "VARIABLE: '", name, "' has Value '", value, "' at line ", line, " in ", file);
 }
 
 }  // namespace KO

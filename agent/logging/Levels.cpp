@@ -15,14 +15,20 @@ bool Levels::set(std::string_view logger, ChannelLevels levels) {
     return true;
 }
 
-bool Levels::admit(Channel channel, std::string_view logger, int level) const {
+int Levels::highest() const {
+    int highest = fallback.highest();
     for (std::size_t index = 0; index < count; ++index) {
-        const Entry& entry = entries[index];
-        if (logger == std::string_view(entry.name.data(), entry.length)) {
-            return level <= entry.levels.of(channel);
-        }
+        highest = std::max(highest, entries[index].levels.highest());
     }
-    return level <= fallback.of(channel);
+    return highest;
+}
+
+const ChannelLevels& Levels::of(std::string_view logger) const {
+    const auto* const end = entries.begin() + count;
+    const auto* const own = std::find_if(entries.begin(), end, [&](const Entry& entry) {
+        return logger == std::string_view(entry.name.data(), entry.length);
+    });
+    return own != end ? own->levels : fallback;
 }
 
 }  // namespace RZLog

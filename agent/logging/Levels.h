@@ -1,5 +1,6 @@
 #pragma once
 
+#include <algorithm>
 #include <array>
 #include <cstddef>
 #include <string_view>
@@ -15,6 +16,7 @@ struct ChannelLevels {
     int trace = 3000;
 
     int of(Channel channel) const { return channel == Channel::log ? log : trace; }
+    int highest() const { return std::max(log, trace); }
 };
 
 /**
@@ -32,8 +34,14 @@ public:
     /** Sets one logger's levels. @return false when there is no room or the name is too long */
     bool set(std::string_view logger, ChannelLevels levels);
 
+    /** The levels of a logger. */
+    const ChannelLevels& of(std::string_view logger) const;
+
+    /** The highest level that any channel of any logger takes. */
+    int highest() const;
+
     /** Whether a record of that level is to be written. */
-    bool admit(Channel channel, std::string_view logger, int level) const;
+    bool admit(Channel channel, std::string_view logger, int level) const { return level <= of(logger).of(channel); }
 
 private:
     struct Entry {

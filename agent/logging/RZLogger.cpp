@@ -27,7 +27,7 @@ private:
 void writeIfAdmitted(const Record& record) noexcept {
     const ErrnoKeeper keeper;
     try {
-        if (admits(record.channel, record.logger, record.level)) {
+        if (record.level <= levelsOf(record.logger).of(record.channel)) {
             write(record);
         }
     } catch (...) {  // the configuration did not fit into memory: the next call tries again
@@ -44,6 +44,18 @@ void RZLogger::logLevelMessage(const char* function, const char* file, int line,
 void RZLogger::traceLevelMessage(const char* function, const char* file, int line, const std::string& logger, int level,
                                  char* /*extra*/, int, int, const std::string& text) {
     writeIfAdmitted({Channel::trace, level, logger, orEmpty(function), orEmpty(file), line, text});
+}
+
+bool RZLogger::admits(const std::string& logger, int level) noexcept {
+    if (level > highestLevel()) {  // nearly always: most records are asked about, and never written
+        return false;
+    }
+    const ErrnoKeeper keeper;
+    try {
+        return level <= levelsOf(logger).highest();
+    } catch (...) {
+        return true;
+    }
 }
 
 }  // namespace RZLog

@@ -3,7 +3,9 @@
 #include "logging/LogSettings.h"
 #include "logging/Sinks.h"
 
+#include <atomic>
 #include <chrono>
+#include <limits>
 #include <mutex>
 #include <type_traits>
 
@@ -12,6 +14,8 @@ namespace RZLog {
 namespace {
 
 constexpr std::chrono::seconds pauseAfterFailure{10};
+
+std::atomic<int> ceiling{std::numeric_limits<int>::max()};
 
 /** The destination and what it is opened with. */
 struct Output {
@@ -64,6 +68,14 @@ void reportProblems(const Agent::Problems& problems, const Levels& levels) {
     }
 }
 
+/** Admits nothing, so that those who ask first do not make up what nobody will read. */
+Levels silence() {
+    constexpr int lowest = std::numeric_limits<int>::min();
+    Levels levels;
+    levels.setDefault({lowest, lowest});
+    return levels;
+}
+
 Levels configure() {
     Agent::Problems problems;
     const Agent::Document document = Agent::Document::readDefault();
@@ -72,21 +84,27 @@ Levels configure() {
     }
     auto newOutput = std::make_unique<Output>();
     newOutput->settings = readLogSettings(document, problems);
-    const Levels levels = newOutput->settings.levels;
+    const bool hasDestination = newOutput->settings.destination != LogSettings::Destination::none;
+    const Levels levels = hasDestination ? newOutput->settings.levels : silence();
     {
         const std::lock_guard<std::mutex> lock(outputMutex);
         output = newOutput.release();
     }
     reportProblems(problems, levels);
+    ceiling = levels.highest();
     return levels;
 }
 
 }  // namespace
 
-bool admits(Channel channel, std::string_view logger, int level) {
+const ChannelLevels& levelsOf(std::string_view logger) {
     static_assert(std::is_trivially_destructible_v<Levels>, "levels are asked for while the process ends");
     static const Levels levels = configure();
-    return levels.admit(channel, logger, level);
+    return levels.of(logger);
+}
+
+int highestLevel() noexcept {
+    return ceiling.load(std::memory_order_relaxed);
 }
 
 void write(const Record& record) noexcept {

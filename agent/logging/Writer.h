@@ -4,8 +4,14 @@
 
 namespace RZLog {
 
-/** Whether the configuration admits a record. The first call in the process reads the configuration. */
-bool admits(Channel channel, std::string_view logger, int level);
+/**
+ * The levels up to which the channels write a logger's records. The first call in the process reads the configuration.
+ * Where it names no destination, nothing is written.
+ */
+const ChannelLevels& levelsOf(std::string_view logger);
+
+/** The highest level of all that levelsOf gives; the highest there is while the configuration has not been read. */
+int highestLevel() noexcept;
 
 /**
  * Writes a record to the configured destination. A destination that fails loses the record and is

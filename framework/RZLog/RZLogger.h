@@ -29,6 +29,15 @@ public:
     /** The same for the trace channel. */
     static void traceLevelMessage(const char* function, const char* file, int line, const std::string& logger,
                                   int level, char* extra, int, int, const std::string& text);
+
+    /**
+     * Whether a record of a level may be written to one of the channels. Who is told no may leave the record out:
+     * its message need not even be put together. Cheap, and never throws.
+     *
+     * A logging library may do without this operation: it is declared weak, and who uses it looks first whether
+     * its address is null.
+     */
+    static bool admits(const std::string& logger, int level) noexcept __attribute__((weak));
 };
 
 }  // namespace RZLog

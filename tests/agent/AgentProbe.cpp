@@ -30,6 +30,14 @@ void log(int level, const std::string& logger, const std::string& text) {
     }
 }
 
+/** probe admits LEVEL LOGGER: says whether the log would take such a record, before it has written one and after. */
+void sayWhetherAdmitted(int level, const std::string& logger) {
+    const auto say = [&] { std::cout << (RZLog::RZLogger::admits(logger, level) ? "yes" : "no") << std::endl; };
+    say();
+    log(level, logger, "some text");
+    say();
+}
+
 /** probe many THREADS RECORDS: numbered records from several threads at a time. */
 void logMany(int threadCount, int recordCount) {
     std::vector<std::thread> threads;
@@ -95,6 +103,8 @@ int main(int count, char** arguments) {
     const std::vector<std::string> words(arguments + 1, arguments + count);
     if (words.size() == 4 && words[0] == "log") {
         log(std::stoi(words[1]), words[2], words[3]);
+    } else if (words.size() == 3 && words[0] == "admits") {
+        sayWhetherAdmitted(std::stoi(words[1]), words[2]);
     } else if (words.size() == 3 && words[0] == "many") {
         logMany(std::stoi(words[1]), std::stoi(words[2]));
     } else if (words.size() == 1 && words[0] == "show") {

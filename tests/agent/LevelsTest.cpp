@@ -33,6 +33,15 @@ TEST(Levels, OfALoggerHoldForItsExactNameOnly) {
     }
 }
 
+TEST(Levels, HaveAHighestOfAllChannelsAndLoggers) {
+    Levels levels;
+    EXPECT_EQ(levels.highest(), 3000);
+    levels.setDefault({1, 4000});
+    EXPECT_EQ(levels.highest(), 4000);
+    ASSERT_TRUE(levels.set("Ostrel.One", {6000, 100}));
+    EXPECT_EQ(levels.highest(), 6000);
+}
+
 TEST(Levels, HaveRoomForSixtyFourLoggersWithNamesOfModestLength) {
     Levels levels;
     EXPECT_FALSE(levels.set(std::string(128, 'x'), {}));

@@ -80,6 +80,22 @@ TEST_F(LogInProcess, WritesNothingAnywhereByDefault) {
     EXPECT_EQ(unconfigured.exitCode, 0);
 }
 
+TEST_F(LogInProcess, SaysBeforeARecordIsMadeWhetherAChannelWouldTakeIt) {
+    const auto admits = [&](const std::string& settings, const std::string& level, const std::string& logger) {
+        const std::string configuration = directory.write("agent.toml", "[log]\n" + settings);
+        return runProbe(configuration, {"admits", level, logger}).output;
+    };
+    const std::string louder =
+        toFile() + "trace_level = 4000\n[[log.logger]]\nname = 'Ostrel.Test'\nlog_level = 6000\n";
+    EXPECT_EQ(admits(toFile(), "3000", "Ostrel.Test"), "yes\nyes\n");
+    EXPECT_EQ(admits(toFile(), "3001", "Ostrel.Test"), "no\nno\n");
+    EXPECT_EQ(admits(louder, "4000", "Ostrel.Other"), "yes\nyes\n") << "the trace channel takes it";
+    EXPECT_EQ(admits(louder, "4001", "Ostrel.Other"), "no\nno\n");
+    EXPECT_EQ(admits(louder, "6000", "Ostrel.Test"), "yes\nyes\n");
+    EXPECT_EQ(admits(louder, "6001", "Ostrel.Test"), "no\nno\n");
+    EXPECT_EQ(admits("log_level = 6000\n", "3000", "Ostrel.Test"), "no\nno\n") << "there is no destination";
+}
+
 TEST_F(LogInProcess, SwallowsRecordsForAFileThatCannotBeOpened) {
     run("destination = '" + directory.path() + "'\n", {"log", "3000", "Ostrel.Test", "to a directory"});
     run("destination = '/proc/no/such/file'\n", {"log", "3000", "Ostrel.Test", "to nowhere"});

@@ -1,0 +1,81 @@
+// Tracing to a logging library that can tell which records it admits.
+
+#include "LogDouble.h"
+#include "Trace.h"
+
+#include <gmock/gmock.h>
+
+#include <stdexcept>
+
+namespace {
+
+using namespace KO;
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+const std::string loggerOfTest("Test.Logger");
+const TraceUnit unit{loggerOfTest, "Unit.cpp"};
+
+/** A value that counts how often it is shown. */
+struct Shown {
+    int& times;
+};
+
+std::ostream& operator<<(std::ostream& stream, const Shown& shown) {
+    ++shown.times;
+    return stream << "value";
+}
+
+class TraceQuery : public testing::Test {
+protected:
+    void SetUp() override {
+        logDouble::records.clear();
+        logDouble::buffersMade = 0;
+    }
+
+    void traceEverything() {
+        const CallSite site{&unit, Level::flow, "work", 7};
+        const Traced traced(site, label::value, Shown{timesShown});
+        traceMethod(site);
+        traceVariable(site, "name", std::string("text"));
+        traceVariable(site, "number", 5U);
+        markProviderEntry(loggerOfTest, "work", "Unit.cpp", 1);
+        markProviderExit(loggerOfTest, "work", "Unit.cpp", 2);
+    }
+
+    int timesShown = 0;
+};
+
+TEST_F(TraceQuery, SparesTheMakingOfLinesThatNobodyWillRead) {
+    logDouble::admittedLevel = Level::flow - 1;
+    traceEverything();
+    EXPECT_THAT(logDouble::records, IsEmpty());
+    EXPECT_EQ(timesShown, 0);
+    EXPECT_EQ(logDouble::buffersMade, 0);
+}
+
+TEST_F(TraceQuery, GivesEveryLineThatIsAdmitted) {
+    logDouble::admittedLevel = Level::flow;
+    traceEverything();
+    EXPECT_EQ(logDouble::records.size(), 18U);
+    EXPECT_EQ(timesShown, 2);
+}
+
+TEST_F(TraceQuery, AsksForTheLevelOfEachLine) {
+    logDouble::admittedLevel = Level::error;
+    const CallSite site{&unit, Level::flow, "work", 7};
+    EXPECT_THROW(fail<std::runtime_error>(site, "It failed."), std::runtime_error);
+    EXPECT_THAT(logDouble::records, ElementsAre("log MESSAGE [File: Unit.cpp, Line: 7]: It failed.",
+                                                "trace MESSAGE [File: Unit.cpp, Line: 7]: It failed."));
+}
+
+TEST_F(TraceQuery, MarksNoExitOfWhatWasNotSeenToBeEntered) {
+    logDouble::admittedLevel = Level::error;
+    {
+        const Traced traced(CallSite{&unit, Level::flow, "work", 7});
+        logDouble::admittedLevel = Level::flow;
+    }
+    EXPECT_THAT(logDouble::records, IsEmpty());
+}
+
+}  // namespace

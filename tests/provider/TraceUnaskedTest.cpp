@@ -1,0 +1,25 @@
+// Tracing to a logging library that cannot tell which records it admits.
+
+#include "LogDouble.h"
+#include "Trace.h"
+
+#include <gmock/gmock.h>
+
+namespace {
+
+using namespace KO;
+using testing::ElementsAre;
+
+const std::string loggerOfTest("Test.Logger");
+const TraceUnit unit{loggerOfTest, "Unit.cpp"};
+
+TEST(TraceUnasked, GivesEveryLineWhateverItsLevel) {
+    { const Traced traced(CallSite{&unit, 10000, "work", 7}, label::value, 5); }
+    EXPECT_THAT(logDouble::records,
+                ElementsAre("log ENTERING: work() in Unit.cpp [Line: 7],Parameters List:  value=5",
+                            "trace ENTERING: work() in Unit.cpp [Line: 7],Parameters List:  value=5",
+                            "log EXITING: work() in Unit.cpp [Line: 7],Parameters List:  value=5",
+                            "trace EXITING: work() in Unit.cpp [Line: 7],Parameters List:  value=5"));
+}
+
+}  // namespace
