@@ -71,7 +71,7 @@ function(law_install_overrides component name)
 endfunction()
 
 law_package(provider lease-warranty-provider
-    DOCUMENTS classes classes.md data-files.md gate.md log-records.md messages.md
+    DOCUMENTS classes classes.md data-files.md gate.md log-records.md messages.md object-managers.md
     DEPENDS "ostrel-reference-agent (>= ${PROJECT_VERSION}) | ostrel-agent"
     DESCRIPTION "CMPI provider for the leases and warranties of a computer
 A library that a CIM object manager (SFCB, OpenPegasus) loads, and that

@@ -4,7 +4,8 @@ import re
 
 from pages import ROOT
 
-TOKEN = re.compile(r'//[^\n]*|/\*.*?\*/|#include[^\n]*|static_assert\([^;]*;|\'(?:\\.|[^\'\\\n])\'|"(?:\\.|[^"\\\n])*"', re.S)
+TOKEN = re.compile(r'//[^\n]*|/\*.*?\*/|#include[^\n]*|static_assert\([^;]*;'
+                   r'|\'(?:\\.|[^\'\\\n])\'|"(?:\\.|[^"\\\n])*"', re.S)
 ESCAPES = {"n": "\n", "t": "\t", "0": "\0"}
 
 

@@ -1,0 +1,40 @@
+"""Reads the documents: the blocks of text in them that are shown as they are."""
+
+import re
+import textwrap
+
+from pages import ROOT
+
+FENCE = re.compile(r"^( *)```(\w*)\n(.*?)^\1```$", re.S | re.M)
+MARK = re.compile(r"<!-- tested: ([\w ]+) -->\s*\Z")
+
+
+class Block:
+    """A block between fences: its language, the mark in front of it that says who runs it, and its text."""
+
+    def __init__(self, document, match):
+        self.place = f"{document.relative_to(ROOT)}:{document.read_text('utf-8')[:match.start()].count(chr(10)) + 1}"
+        self.language = match[2]
+        self.text = textwrap.dedent(match[3])
+        mark = MARK.search(match.string, 0, match.start())
+        self.mark = mark[1] if mark else ""
+
+
+def all_documents():
+    return [ROOT / "README.md", ROOT / "CONTRIBUTING.md", *sorted((ROOT / "docs").rglob("*.md"))]
+
+
+def blocks(document):
+    return [Block(document, match) for match in FENCE.finditer(document.read_text("utf-8"))]
+
+
+def all_blocks(language=None, mark=None):
+    return [block for document in all_documents() for block in blocks(document)
+            if language in (None, block.language) and mark in (None, block.mark)]
+
+
+def without_tested_blocks(document):
+    """What is left of a document without the blocks that say who runs them, and those that are illustrations."""
+    text = document.read_text("utf-8")
+    tested = lambda match: "" if Block(document, match).mark or match[2] == "console" else match[0]  # noqa: E731
+    return FENCE.sub(tested, text)
