@@ -7,6 +7,7 @@
 #include "Installation.h"
 #include "cli/ExitStatus.h"
 #include "cli/LoadArguments.h"
+#include "cli/Suggestion.h"
 
 namespace cimhost {
 namespace {
@@ -49,30 +50,32 @@ struct Command {
     bool associates;  ///< takes --assoc-class, --result-role
     bool refers;      ///< takes --result-class, --role
     bool lists;       ///< takes --property
+    const char* example;
 };
 
 constexpr Command commands[] = {
     {Operation::enumerateInstances, "enumerate-instances", "ei", "List the instances of a class", Target::className,
-     false, false, false, true},
+     false, false, false, true, "cimhost ei Some_Class --property Size"},
     {Operation::enumerateInstanceNames, "enumerate-instance-names", "ein", "List the paths of a class's instances",
-     Target::className, false, false, false, false},
-    {Operation::getInstance, "get-instance", "gi", "Show an instance", Target::objectPath, false, false, false, true},
+     Target::className, false, false, false, false, "cimhost --format json ein Some_Class"},
+    {Operation::getInstance, "get-instance", "gi", "Show an instance", Target::objectPath, false, false, false, true,
+     "cimhost gi 'Some_Class.InstanceID=\"1\"'"},
     {Operation::createInstance, "create-instance", "ci", "Create an instance and show its path", Target::objectPath,
-     true, false, false, false},
+     true, false, false, false, "cimhost ci 'Some_Class.InstanceID=\"1\"' ElementName='a name' Size=5"},
     {Operation::modifyInstance, "modify-instance", "mi", "Set properties of an instance", Target::objectPath, true,
-     false, false, false},
+     false, false, false, "cimhost mi 'Some_Class.InstanceID=\"1\"' Size=6 --null ElementName"},
     {Operation::deleteInstance, "delete-instance", "di", "Delete an instance", Target::objectPath, false, false, false,
-     false},
+     false, "cimhost di 'Some_Class.InstanceID=\"1\"'"},
     {Operation::associators, "associators", "ai", "List the instances associated with an instance", Target::objectPath,
-     false, true, true, true},
+     false, true, true, true, "cimhost ai 'Some_System.Name=\"host\"' --assoc-class Some_Association"},
     {Operation::associatorNames, "associator-names", "ain", "List the paths of the instances associated with one",
-     Target::objectPath, false, true, true, false},
+     Target::objectPath, false, true, true, false, "cimhost ain 'Some_System.Name=\"host\"' --result-class Some_Class"},
     {Operation::references, "references", "ri", "List the associations that refer to an instance", Target::objectPath,
-     false, false, true, true},
+     false, false, true, true, "cimhost ri 'Some_System.Name=\"host\"' --result-class Some_Association"},
     {Operation::referenceNames, "reference-names", "rin", "List the paths of the associations that refer to one",
-     Target::objectPath, false, false, true, false},
+     Target::objectPath, false, false, true, false, "cimhost rin 'Some_System.Name=\"host\"'"},
     {std::nullopt, "classes", nullptr, "List the classes and the providers that serve them", Target::none, false, false,
-     false, false},
+     false, false, "cimhost --schema my.mof classes"},
 };
 
 Format formatNamed(const std::string& word) {
@@ -91,6 +94,16 @@ Manager managerCalled(const std::string& word) {
         throw CLI::ValidationError("--as", word + " is not one of standard, sfcb and pegasus");
     }
     return *manager;
+}
+
+text::Colours coloursCalled(const std::string& word) {
+    const std::map<std::string, text::Colours> wishes = {
+        {"auto", text::Colours::automatic}, {"always", text::Colours::always}, {"never", text::Colours::never}};
+    const auto found = wishes.find(word);
+    if (found == wishes.end()) {
+        throw CLI::ValidationError("--color", word + " is not one of auto, always and never");
+    }
+    return found->second;
 }
 
 void addCommonOptions(CLI::App& app, Arguments& arguments) {
@@ -114,6 +127,10 @@ void addCommonOptions(CLI::App& app, Arguments& arguments) {
     app.add_option_function<std::string>("--as", setManager,
                                          "Object manager to behave like: standard (default), sfcb or pegasus")
         ->type_name("MANAGER");
+    const auto setColours = [&arguments](const std::string& word) { arguments.colours = coloursCalled(word); };
+    app.add_option_function<std::string>("--color", setColours,
+                                         "Colours in text: auto (default: on a terminal), always or never")
+        ->type_name("WHEN");
     app.add_flag("--raw", arguments.raw,
                  "Show exactly what the provider did: its status, each object it returned, its calls of returnDone");
 }
@@ -121,7 +138,8 @@ void addCommonOptions(CLI::App& app, Arguments& arguments) {
 void addCommand(CLI::App& app, const Command& command, Arguments& arguments) {
     CLI::App* sub = app.add_subcommand(command.name, command.description);
     sub->fallthrough();
-    sub->footer("See cimhost --help for options of all commands and for examples.");
+    sub->footer(std::string("Example:\n\n  ") + command.example +
+                "\n\nSee cimhost --help for options of all commands and for more examples.");
     if (command.shortName != nullptr) {
         sub->alias(command.shortName);
     }
@@ -153,6 +171,28 @@ void addCommand(CLI::App& app, const Command& command, Arguments& arguments) {
     sub->callback([&arguments, &command] { arguments.operation = command.operation; });
 }
 
+/** All that could stand where a word does that is not known: names of commands, and options. */
+std::vector<std::string> wordsOf(const CLI::App& app) {
+    std::vector<std::string> words;
+    for (const CLI::App* command : app.get_subcommands([](const CLI::App*) { return true; })) {
+        words.push_back(command->get_name());
+    }
+    for (const CLI::App* each : {&app, app.get_subcommands().empty() ? &app : app.get_subcommands().front()}) {
+        for (const CLI::Option* option : each->get_options([](const CLI::Option*) { return true; })) {
+            words.push_back(option->get_name());
+        }
+    }
+    return words;
+}
+
+/** What is wrong with words that neither a command nor an option takes, and what was perhaps meant. */
+std::string unknownText(const CLI::App& app, const std::string& word) {
+    const std::vector<CLI::App*> used = app.get_subcommands();
+    const std::string command = used.empty() ? "" : used.front()->get_name() + " ";
+    const std::string what = used.empty() ? "there is no command or option " + word : command + "takes no " + word;
+    return what + didYouMean(word, wordsOf(app)) + "\nRun cimhost " + command + "--help for what there is.";
+}
+
 /** Ends the program with what help, version or the mistake have to say. */
 void end(ParsedArguments& parsed, const CLI::App& app, const CLI::ParseError& error) {
     std::ostringstream output;
@@ -163,12 +203,10 @@ void end(ParsedArguments& parsed, const CLI::App& app, const CLI::ParseError& er
     if (parsed.exitStatus == exitSuccess) {
         return;
     }
-    const std::vector<std::string> unknown = app.remaining();
-    const bool noCommand = app.get_subcommands().empty() && !unknown.empty();
-    parsed.error = noCommand
-                       ? "there is no command or option " + unknown.front() + "\nRun with --help for those there are.\n"
-                       : problem.str();
-    parsed.error = "cimhost: " + parsed.error;
+    const std::vector<std::string> unknown = app.remaining(true);
+    const bool isUnknown = dynamic_cast<const CLI::ExtrasError*>(&error) != nullptr || app.get_subcommands().empty();
+    parsed.error = isUnknown && !unknown.empty() ? unknownText(app, unknown.front()) : problem.str();
+    parsed.error.erase(parsed.error.find_last_not_of('\n') + 1);
 }
 
 }  // namespace

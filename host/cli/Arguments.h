@@ -5,6 +5,7 @@
 #include <string>
 #include <vector>
 
+#include "cli/Style.h"
 #include "operations/Request.h"
 
 namespace cimhost {
@@ -42,6 +43,8 @@ struct Arguments {
     Format format = Format::text;
     bool raw = false;
     Manager manager = Manager::standard;
+    text::Colours colours = text::Colours::automatic;
+    text::Style style{};  ///< for people, on standard output
 };
 
 /** What became of reading a command line: arguments to act on, or an end with something to say. */

@@ -6,6 +6,7 @@
 #include "cli/LoadCommand.h"
 #include "cli/Locations.h"
 #include "cli/RequestBuilder.h"
+#include "cli/Suggestion.h"
 #include "cli/TextOutput.h"
 #include "operations/ClassShapes.h"
 #include "operations/Interpretation.h"
@@ -52,85 +53,111 @@ std::string mofOf(const std::vector<Instance>& instances) {
     return text;
 }
 
-Outcome showInstances(const Answers& answers, Operation operation, Format format) {
+Outcome showInstances(const Answers& answers, Operation operation, const Arguments& arguments) {
     const Answer<std::vector<Instance>> found = resultsOf<Instance>(answers, operation);
     if (!found.ok()) {
         return {"", found.status};
     }
-    switch (format) {
+    switch (arguments.format) {
         case Format::json:
             return {json::format(found.value)};
         case Format::mof:
             return {mofOf(found.value)};
         default:
-            return {text::format(found.value)};
+            return {text::format(found.value, arguments.style)};
     }
 }
 
-Outcome showInstance(const Answers& answers, const ObjectPath& path, Format format) {
+Outcome showInstance(const Answers& answers, const ObjectPath& path, const Arguments& arguments) {
     const Answer<Instance> found = oneInstance(answers, path);
     if (!found.ok()) {
         return {"", found.status};
     }
-    switch (format) {
+    switch (arguments.format) {
         case Format::json:
             return {json::format(found.value)};
         case Format::mof:
             return {formatMof(found.value)};
         default:
-            return {text::format(std::vector<Instance>{found.value})};
+            return {text::format(std::vector<Instance>{found.value}, arguments.style)};
     }
 }
 
-Outcome showPaths(const Answers& answers, Operation operation, Format format) {
+Outcome showPaths(const Answers& answers, Operation operation, const Arguments& arguments) {
     const Answer<std::vector<ObjectPath>> found = resultsOf<ObjectPath>(answers, operation);
     if (!found.ok()) {
         return {"", found.status};
     }
-    return {format == Format::json ? json::format(found.value) : text::format(found.value)};
+    return {arguments.format == Format::json ? json::format(found.value) : text::format(found.value, arguments.style)};
 }
 
-Outcome showCreated(const Answers& answers, Format format) {
+Outcome showCreated(const Answers& answers, const Arguments& arguments) {
     const Answer<ObjectPath> created = createdPath(answers);
     if (!created.ok()) {
         return {"", created.status};
     }
-    return {format == Format::json ? json::format(created.value)
-                                   : text::format(std::vector<ObjectPath>{created.value})};
+    return {arguments.format == Format::json ? json::format(created.value)
+                                             : text::format(std::vector<ObjectPath>{created.value}, arguments.style)};
 }
 
-Outcome show(const Answers& answers, const Request& request, Format format) {
+Outcome show(const Answers& answers, const Request& request, const Arguments& arguments) {
     switch (request.operation) {
         case Operation::enumerateInstances:
         case Operation::associators:
         case Operation::references:
-            return showInstances(answers, request.operation, format);
+            return showInstances(answers, request.operation, arguments);
         case Operation::enumerateInstanceNames:
         case Operation::associatorNames:
         case Operation::referenceNames:
-            return showPaths(answers, request.operation, format);
+            return showPaths(answers, request.operation, arguments);
         case Operation::getInstance:
-            return showInstance(answers, request.path, format);
+            return showInstance(answers, request.path, arguments);
         case Operation::createInstance:
-            return showCreated(answers, format);
+            return showCreated(answers, arguments);
         default:
             return {"", statusOf(answers, request.operation)};
     }
 }
 
-Outcome showRaw(const Answers& answers, Operation operation, Format format) {
-    return {format == Format::json ? json::format(answers.value) : text::format(answers.value),
-            statusOf(answers, operation)};
+Outcome showRaw(const Answers& answers, Operation operation, const Arguments& arguments) {
+    return {
+        arguments.format == Format::json ? json::format(answers.value) : text::format(answers.value, arguments.style),
+        statusOf(answers, operation)};
+}
+
+/** What to try when there is no such class, namespace or instance. */
+std::string hintFor(int code, const Request& request, const std::vector<ProviderRegistration>& registrations) {
+    const std::string className = request.filter.associationClass.value_or(request.path.className);
+    std::vector<std::string> names;
+    names.reserve(registrations.size());
+    for (const ProviderRegistration& each : registrations) {
+        names.push_back(each.className);
+    }
+    switch (code) {
+        case CMPI_RC_ERR_INVALID_CLASS:
+            return "Run cimhost classes for those that are served" + didYouMean(className, names);
+        case CMPI_RC_ERR_INVALID_NAMESPACE:
+            return "Run cimhost classes for where each class is served; --namespace names another.";
+        case CMPI_RC_ERR_NOT_FOUND:
+            return "Run cimhost enumerate-instance-names " + request.path.className + " for those that there are.";
+        default:
+            return "";
+    }
 }
 
 Outcome runRequest(const Arguments& arguments, const Locations& locations, const Schema& schema) {
-    const ProviderRegistry registry(readRegistrations(locations));
+    const std::vector<ProviderRegistration> registrations = readRegistrations(locations);
+    const ProviderRegistry registry(registrations);
     try {
         const Request request = buildRequest(arguments, schema);
         ObjectManager manager(managerOptions(arguments, locations, schema), registry);
         const Answers answers = manager.run(request);
-        return arguments.raw ? showRaw(answers, request.operation, arguments.format)
-                             : show(answers, request, arguments.format);
+        if (arguments.raw) {
+            return showRaw(answers, request.operation, arguments);
+        }
+        Outcome outcome = show(answers, request, arguments);
+        outcome.hint = hintFor(outcome.status.rc, request, registrations);
+        return outcome;
     } catch (const UnknownClass& error) {
         return {"", {CMPI_RC_ERR_INVALID_CLASS, error.what()}};
     }
@@ -156,7 +183,7 @@ Outcome runCommand(const Arguments& arguments) {
         return runLoadCommand(manager, arguments, schema);
     }
     const std::vector<ListedClass> classes = listClasses(schema, readRegistrations(locations));
-    return {arguments.format == Format::json ? json::format(classes) : text::format(classes)};
+    return {arguments.format == Format::json ? json::format(classes) : text::format(classes, arguments.style)};
 }
 
 }  // namespace cimhost

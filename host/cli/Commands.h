@@ -12,6 +12,7 @@ struct Outcome {
     std::string output{};
     Status status{};
     std::string complaint{};  ///< what is wrong although the request itself ended well; empty: nothing
+    std::string hint{};       ///< what to try where the request did not end well; empty: nothing
 };
 
 /**

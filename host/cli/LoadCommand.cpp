@@ -56,9 +56,10 @@ Outcome runLoadCommand(ObjectManager& manager, const Arguments& arguments, const
         if (!report.ok()) {
             return {"", report.status, ""};
         }
-        return {arguments.format == Format::json ? json::format(report.value) : text::format(report.value),
-                {},
-                complaintOf(report.value)};
+        return {
+            arguments.format == Format::json ? json::format(report.value) : text::format(report.value, arguments.style),
+            {},
+            complaintOf(report.value)};
     } catch (const load::PlanError& error) {
         throw UsageError(error.what());
     }

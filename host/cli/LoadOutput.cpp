@@ -64,7 +64,7 @@ Json wrongJson(const load::WrongAnswer& answer) {
 
 }  // namespace
 
-std::string text::format(const load::Report& report) {
+std::string text::format(const load::Report& report, const Style& style) {
     std::vector<Row> rows{{"", "requests", "wrong", "per second", "p50 us", "p95 us", "p99 us", "max us"}};
     for (const load::Figures& each : report.deeds) {
         rows.push_back(rowOf(each));
@@ -72,7 +72,7 @@ std::string text::format(const load::Report& report) {
     rows.push_back(rowOf(report.all));
     return std::to_string(report.clients) + " clients, " + std::to_string(report.all.requests) + " requests, manager " +
            report.manager + ", seed " + std::to_string(report.seed) + ": " + rounded(report.seconds, 3) + " s\n\n" +
-           aligned(rows, "") + "\n" + wrongText(report);
+           aligned(rows, "", style, {Role::name}) + "\n" + wrongText(report);
 }
 
 std::string json::format(const load::Report& report) {

@@ -4,6 +4,7 @@
 
 #include "broker/NamedValues.h"
 #include "cli/ExitStatus.h"
+#include "cli/Suggestion.h"
 #include "cli/Words.h"
 #include "schema/Literal.h"
 #include "schema/MofWriter.h"
@@ -37,7 +38,7 @@ const Property& propertyOf(const Class& known, const std::string& name) {
         names.push_back(each.name);
     }
     throw UsageError("class " + known.name + " has no property " + name + "; its properties are " +
-                     joined(names, ", "));
+                     joined(names, ", ") + didYouMean(name, names));
 }
 
 /** Reads the values of a command line for one class. */

@@ -3,23 +3,118 @@
 #include <algorithm>
 
 namespace cimhost::text {
+namespace {
 
-std::string aligned(const std::vector<Row>& rows, const std::string& indent) {
-    std::vector<std::size_t> widths;
-    for (const Row& row : rows) {
-        widths.resize(std::max(widths.size(), row.size()));
-        for (std::size_t i = 0; i < row.size(); ++i) {
-            widths[i] = std::max(widths[i], row[i].size());
+constexpr std::size_t gap = 2;              ///< blanks between columns
+constexpr std::size_t leastLastWidth = 16;  ///< less is no room for the last column
+
+bool beginsCharacter(char byte) {
+    return (static_cast<unsigned char>(byte) & 0xC0U) != 0x80U;  // the others go on with a character of UTF-8
+}
+
+std::size_t widthOf(const std::string& text) {
+    return static_cast<std::size_t>(std::count_if(text.begin(), text.end(), beginsCharacter));
+}
+
+/** Where the part of a text ends that begins at a place and has room: behind its last blank, if it has one. */
+std::size_t endOfPart(const std::string& text, std::size_t begin, std::size_t room) {
+    std::size_t afterBlank = begin;
+    std::size_t width = 0;
+    for (std::size_t at = begin; at < text.size(); ++at) {
+        width += beginsCharacter(text[at]) ? 1U : 0U;
+        if (width > room) {
+            return afterBlank > begin ? afterBlank : at;
         }
+        afterBlank = text[at] == ' ' ? at + 1 : afterBlank;
     }
+    return text.size();
+}
+
+/** The text in parts that have room; put together, they are the text. */
+std::vector<std::string> parts(const std::string& text, std::size_t room) {
+    std::vector<std::string> found;
+    for (std::size_t begin = 0; begin < text.size();) {
+        const std::size_t end = room == 0 ? text.size() : endOfPart(text, begin, room);
+        found.push_back(text.substr(begin, end - begin));
+        begin = end;
+    }
+    return found;
+}
+
+/** Lays rows out; its widths are those of the columns but the last. */
+class Layout {
+public:
+    Layout(const std::vector<Row>& rows, std::string itsIndent, const Style& itsStyle,
+           const std::vector<Role>& itsRoles)
+        : indent(std::move(itsIndent)), style(itsStyle), roles(itsRoles) {
+        std::size_t last = 0;
+        for (const Row& row : rows) {
+            widths.resize(std::max(widths.size(), row.size()));
+            for (std::size_t i = 0; i < row.size(); ++i) {
+                widths[i] = std::max(widths[i], widthOf(row[i]));
+            }
+        }
+        if (!widths.empty()) {
+            last = widths.back();
+            widths.pop_back();
+        }
+        for (const std::size_t width : widths) {
+            lastBegins += width + gap;
+        }
+        isNarrow = style.width != 0 && lastBegins + std::min(last, leastLastWidth) > style.width;
+    }
+
+    std::string text(const Row& row) const { return row.empty() ? "\n" : isNarrow ? stacked(row) : sideBySide(row); }
+
+private:
+    std::string cell(const Row& row, std::size_t column, const std::string& content) const {
+        return painted(content, column < roles.size() && column < row.size() ? roles[column] : Role::plain, style);
+    }
+
+    std::string sideBySide(const Row& row) const {
+        std::string line = indent;
+        for (std::size_t i = 0; i + 1 < row.size(); ++i) {
+            line += cell(row, i, row[i]) + std::string(widths[i] - widthOf(row[i]) + gap, ' ');
+        }
+        const bool hasLast = row.size() == widths.size() + 1;
+        return line + below(row, row.size() - 1, hasLast ? lastBegins : 0);
+    }
+
+    std::string stacked(const Row& row) const {
+        std::string lines = indent + cell(row, 0, row.front()) + "\n";
+        const std::string deeper = indent + std::string(gap, ' ');
+        for (std::size_t i = 1; i < row.size(); ++i) {
+            lines += deeper + below(row, i, deeper.size());
+        }
+        return lines;
+    }
+
+    /** A cell that goes on below where it begins. */
+    std::string below(const Row& row, std::size_t column, std::size_t begins) const {
+        const std::size_t room = style.width > begins && begins != 0 ? style.width - begins : 0;
+        std::string lines;
+        for (const std::string& part : parts(row[column], room)) {
+            lines += (lines.empty() ? "" : std::string(begins, ' ')) + cell(row, column, part) + "\n";
+        }
+        return lines.empty() ? "\n" : lines;
+    }
+
+    std::string indent;
+    const Style& style;
+    const std::vector<Role>& roles;
+    std::vector<std::size_t> widths{};
+    std::size_t lastBegins = indent.size();
+    bool isNarrow = false;
+};
+
+}  // namespace
+
+std::string aligned(const std::vector<Row>& rows, const std::string& indent, const Style& style,
+                    const std::vector<Role>& roles) {
+    const Layout layout(rows, indent, style, roles);
     std::string text;
     for (const Row& row : rows) {
-        std::string line = indent;
-        for (std::size_t i = 0; i < row.size(); ++i) {
-            line += row[i];
-            line += i + 1 < row.size() ? std::string(widths[i] - row[i].size() + 2, ' ') : "";
-        }
-        text += line + "\n";
+        text += layout.text(row);
     }
     return text;
 }

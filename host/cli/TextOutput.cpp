@@ -20,17 +20,22 @@ std::string valueText(const Value& value) {
     return formatMof(value);
 }
 
-std::string instanceText(const Instance& instance, const std::string& indent) {
+std::string instanceText(const Instance& instance, const std::string& indent, const Style& style) {
     std::vector<Row> rows;
     for (const NamedValue& property : instance.properties) {
         const std::string type = std::string(typeName(property.value.type)) + (property.value.isArray ? "[]" : "");
         rows.push_back({property.name, type, valueText(property.value)});
     }
-    return formatObjectPath(instance.path) + "\n" + aligned(rows, indent + "  ");
+    return painted(formatObjectPath(instance.path), Role::heading, style) + "\n" +
+           aligned(rows, indent + "  ", style, {Role::name, Role::detail});
 }
 
 struct EventText {
-    std::string operator()(const Instance& instance) const { return "instance " + instanceText(instance, "   "); }
+    const Style& style;
+
+    std::string operator()(const Instance& instance) const {
+        return "instance " + instanceText(instance, "   ", style);
+    }
     std::string operator()(const ObjectPath& path) const { return "object path " + formatObjectPath(path) + "\n"; }
     std::string operator()(const Value& value) const {
         return "data " + std::string(typeName(value.type)) + (value.isArray ? "[] " : " ") + valueText(value) + "\n";
@@ -41,7 +46,7 @@ struct EventText {
     std::string operator()(const Done&) const { return "done\n"; }
 };
 
-std::string answerText(const RawAnswer& answer) {
+std::string answerText(const RawAnswer& answer, const Style& style) {
     std::string text = "status: " + std::to_string(answer.status.rc) + " (" + codeName(answer.status.rc) + ")\n";
     if (answer.hasMessage || answer.threw) {
         const Value message{CMPI_string, false, false, {answer.status.message}};
@@ -49,7 +54,7 @@ std::string answerText(const RawAnswer& answer) {
     }
     int number = 0;
     for (const ResultEvent& event : answer.events) {
-        text += std::to_string(++number) + ". " + std::visit(EventText{}, event);
+        text += std::to_string(++number) + ". " + std::visit(EventText{style}, event);
     }
     return text + "returnDone: " + std::to_string(answer.doneCount()) + "\n";
 }
@@ -68,31 +73,31 @@ Row providerRow(const ListedClass& listed, const ProviderRegistration& provider)
 
 }  // namespace
 
-std::string format(const std::vector<Instance>& instances) {
+std::string format(const std::vector<Instance>& instances, const Style& style) {
     std::string text;
     for (const Instance& instance : instances) {
-        text += (text.empty() ? "" : "\n") + instanceText(instance, "");
+        text += (text.empty() ? "" : "\n") + instanceText(instance, "", style);
     }
     return text;
 }
 
-std::string format(const std::vector<ObjectPath>& paths) {
+std::string format(const std::vector<ObjectPath>& paths, const Style& style) {
     std::string text;
     for (const ObjectPath& path : paths) {
-        text += formatObjectPath(path) + "\n";
+        text += painted(formatObjectPath(path), Role::heading, style) + "\n";
     }
     return text;
 }
 
-std::string format(const std::vector<RawAnswer>& answers) {
+std::string format(const std::vector<RawAnswer>& answers, const Style& style) {
     std::string text;
     for (const RawAnswer& answer : answers) {
-        text += (text.empty() ? "" : "\n") + answerText(answer);
+        text += (text.empty() ? "" : "\n") + answerText(answer, style);
     }
     return text;
 }
 
-std::string format(const std::vector<ListedClass>& classes) {
+std::string format(const std::vector<ListedClass>& classes, const Style& style) {
     std::vector<Row> rows;
     for (const ListedClass& listed : classes) {
         for (const ProviderRegistration& provider : listed.providers) {
@@ -102,7 +107,7 @@ std::string format(const std::vector<ListedClass>& classes) {
             rows.push_back({listed.name, "-"});
         }
     }
-    return aligned(rows, "");
+    return aligned(rows, "", style, {Role::heading});
 }
 
 }  // namespace cimhost::text

@@ -1,3 +1,5 @@
+#include <unistd.h>
+
 #include <cerrno>
 #include <csignal>
 #include <cstdio>
@@ -14,8 +16,11 @@ namespace {
 
 using namespace cimhost;
 
+/** How standard error looks. */
+text::Style errorStyle;
+
 void complain(const std::string& text) {
-    std::fprintf(stderr, "cimhost: %s\n", text.c_str());
+    std::fprintf(stderr, "%s %s\n", text::painted("cimhost:", text::Role::alarm, errorStyle).c_str(), text.c_str());
 }
 
 /** Writes all of the text to standard output, or says why that cannot be done. */
@@ -34,6 +39,9 @@ int run(const Arguments& arguments) {
     }
     if (!outcome.status.ok()) {
         complain(errorText(outcome.status));
+        if (!outcome.hint.empty()) {
+            std::fprintf(stderr, "%s\n", outcome.hint.c_str());
+        }
         return exitCimError;
     }
     if (!outcome.complaint.empty()) {
@@ -70,10 +78,14 @@ int runGuarded(const Arguments& arguments) {
 
 int main(int count, char** values) {
     std::signal(SIGPIPE, SIG_IGN);  // a closed pipe is an error to report, not a silent end
-    const ParsedArguments parsed = parseArguments(count, values);
+    ParsedArguments parsed = parseArguments(count, values);
+    errorStyle = text::styleFor(STDERR_FILENO, parsed.arguments.colours);
+    parsed.arguments.style = text::styleFor(STDOUT_FILENO, parsed.arguments.colours);
     if (!parsed.ended) {
         return runGuarded(parsed.arguments);
     }
-    std::fputs(parsed.error.c_str(), stderr);
+    if (!parsed.error.empty()) {
+        complain(parsed.error);
+    }
     return writeOutput(parsed.output) ? parsed.exitStatus : static_cast<int>(exitOutput);
 }

@@ -125,7 +125,9 @@ TEST(DeleteInstance, SaysNothingWhenItSucceedsAndWhyWhenItDoesNot) {
     EXPECT_EQ(deleted.output + deleted.error, "");
     const Ended missing = run({"di", "Test_Box.Name=\"B\""});
     EXPECT_EQ(missing.status, 1);
-    EXPECT_EQ(missing.error, "cimhost: error 6 (CMPI_RC_ERR_NOT_FOUND): no such box\n");
+    EXPECT_EQ(missing.error,
+              "cimhost: error 6 (CMPI_RC_ERR_NOT_FOUND): no such box\n"
+              "Run cimhost enumerate-instance-names Test_Box for those that there are.\n");
 }
 
 TEST(Associators, ShowTheInstancesAtTheOtherEnd) {

@@ -1,9 +1,12 @@
 #include "host/cli/Program.h"
 
 #include <fcntl.h>
+#include <pty.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include <algorithm>
+#include <cerrno>
 #include <cstring>
 #include <fstream>
 #include <sstream>
@@ -76,9 +79,57 @@ Ended runBare(const std::vector<std::string>& arguments, const Environment& envi
             contentOf(error)};
 }
 
-Ended run(std::vector<std::string> arguments) {
+namespace {
+
+void addTestClasses(std::vector<std::string>& arguments) {
     arguments.insert(arguments.begin(), {"--schema", dataFile("test.mof"), "--registration", dataFile("test.reg"),
                                          "--library-path", PROVIDER_DIRECTORY});
+}
+
+/** What the terminal shows until nobody has it open any more. */
+std::string shownOn(int terminal) {
+    std::string text;
+    char block[4096];
+    for (;;) {
+        const ssize_t count = read(terminal, block, sizeof block);
+        if (count < 0 && errno == EINTR) {
+            continue;
+        }
+        if (count <= 0) {
+            text.erase(std::remove(text.begin(), text.end(), '\r'), text.end());
+            return text;
+        }
+        text.append(block, static_cast<std::size_t>(count));
+    }
+}
+
+}  // namespace
+
+Ended runOnTerminal(std::vector<std::string> arguments, unsigned short columns, const Environment& environment) {
+    const std::string program = testsupport::underTest(CIMHOST_PROGRAM);
+    addTestClasses(arguments);
+    arguments.insert(arguments.begin(), program);
+    Environment all = environment;
+    all.insert(all.end(), {"TERM=xterm", "NO_COLOR=", "COLUMNS="});  // the first of a name counts
+    std::vector<std::string> variables = environmentWith(all);
+    const std::vector<char*> wordPointers = pointersTo(arguments);
+    const std::vector<char*> variablePointers = pointersTo(variables);
+    const winsize size{24, columns, 0, 0};
+    int terminal = -1;
+    const pid_t child = forkpty(&terminal, nullptr, nullptr, &size);
+    if (child == 0) {
+        execve(program.c_str(), wordPointers.data(), variablePointers.data());
+        _exit(126);
+    }
+    const std::string shown = shownOn(terminal);
+    close(terminal);
+    int status = 0;
+    waitpid(child, &status, 0);
+    return {WIFEXITED(status) ? WEXITSTATUS(status) : -1, shown, ""};
+}
+
+Ended run(std::vector<std::string> arguments) {
+    addTestClasses(arguments);
     return runBare(arguments);
 }
 

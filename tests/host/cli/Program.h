@@ -19,6 +19,9 @@ using Environment = std::vector<std::string>;
 Ended runBare(const std::vector<std::string>& arguments, const Environment& environment = {},
               const std::string& outputFile = "");
 
+/** The same on a terminal of that many columns, which takes both streams; lines end with a line feed alone. */
+Ended runOnTerminal(std::vector<std::string> arguments, unsigned short columns, const Environment& environment = {});
+
 /** Runs cimhost with the test classes and their provider. */
 Ended run(std::vector<std::string> arguments);
 

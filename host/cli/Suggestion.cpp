@@ -1,0 +1,47 @@
+#include "cli/Suggestion.h"
+
+#include <algorithm>
+#include <numeric>
+
+#include "schema/Names.h"
+
+namespace cimhost {
+namespace {
+
+/** How many letters must be put in, taken away or exchanged to make one word the other. */
+std::size_t distance(const std::string& one, const std::string& other) {
+    std::vector<std::size_t> row(other.size() + 1);
+    std::iota(row.begin(), row.end(), std::size_t{0});
+    for (std::size_t i = 0; i < one.size(); ++i) {
+        std::size_t diagonal = row[0];
+        row[0] = i + 1;
+        for (std::size_t j = 0; j < other.size(); ++j) {
+            const std::size_t exchanged = diagonal + (one[i] == other[j] ? 0U : 1U);
+            diagonal = row[j + 1];
+            row[j + 1] = std::min({exchanged, row[j] + 1, row[j + 1] + 1});
+        }
+    }
+    return row.back();
+}
+
+}  // namespace
+
+std::string nearest(std::string_view word, const std::vector<std::string>& names) {
+    std::string found;
+    std::size_t least = std::max<std::size_t>(1, word.size() / 4) + 1;
+    for (const std::string& name : names) {
+        const std::size_t far = distance(foldedName(word), foldedName(name));
+        if (far < least) {
+            least = far;
+            found = name;
+        }
+    }
+    return found;
+}
+
+std::string didYouMean(std::string_view word, const std::vector<std::string>& names) {
+    const std::string name = nearest(word, names);
+    return name.empty() ? "" : "; did you mean " + name + "?";
+}
+
+}  // namespace cimhost
