@@ -2,11 +2,20 @@
 
 #include "configuration/FileContent.h"
 #include "configuration/Toml.h"
+#include "configuration/TomlText.h"
 
 #include <cstdlib>
-#include <sstream>
 
 namespace Agent {
+
+namespace {
+
+std::string invalid(const std::string& name, std::size_t line, std::string_view reason) {
+    return name + " is not valid TOML (line " + std::to_string(line) + ": " + std::string(reason) +
+           "); using the defaults";
+}
+
+}  // namespace
 
 struct Document::Content {
     toml::table table;
@@ -36,16 +45,16 @@ Document Document::readDefault() {
 
 Document Document::parse(std::string_view text, const std::string& name) {
     Document document;
+    if (const std::optional<Objection> objection = objectionTo(text)) {
+        document.whatIsWrong = invalid(name, objection->line, objection->reason);
+        return document;
+    }
     toml::parse_result result = toml::parse(text, name);
     if (result) {
         document.content->table = std::move(result).table();
-        return document;
+    } else {
+        document.whatIsWrong = invalid(name, result.error().source().begin.line, result.error().description());
     }
-    std::ostringstream problem;
-    problem.imbue(std::locale::classic());
-    problem << name << " is not valid TOML (line " << result.error().source().begin.line << ": "
-            << result.error().description() << "); using the defaults";
-    document.whatIsWrong = problem.str();
     return document;
 }
 

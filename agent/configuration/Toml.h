@@ -4,6 +4,8 @@
 #define TOML_HEADER_ONLY 0
 #define TOML_EXCEPTIONS 0
 #define TOML_ENABLE_FORMATTERS 0
+// Values in values: the parser goes as deep, and so does the destruction of what it has made.
+#define TOML_MAX_NESTED_VALUES 16
 
 #pragma GCC diagnostic push
 #pragma GCC diagnostic ignored "-Wconversion"

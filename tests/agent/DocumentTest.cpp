@@ -47,6 +47,45 @@ TEST(Document, IsEmptyWithAProblemThatNamesTheLineWhenItIsNoToml) {
     EXPECT_EQ(nameIn(document), std::nullopt);
 }
 
+TEST(Document, IsNoTomlWithCharactersOutsideOfAsciiOutsideOfStringsAndComments) {
+    for (const char* text : {"n\xC3\xA4me = 1\n", "name = 1 \xD2\x97\n", "\xE2\x80\x80name = 1\n", "name = \xFF\n",
+                             "name = 'x' \xC2\xA0# y\n", "name = \"\"\"x\"\"\"\xC3\xA4\n", "name = '''x'''\xC3\xA4\n",
+                             "name = 2\"\xC3\xA4\"", "name = 2 '\xC3\xA4'\n"}) {
+        const Document document = Document::parse(text, "agent.toml");
+        EXPECT_THAT(document.problem(), StartsWith("agent.toml is not valid TOML (line 1: ")) << text;
+        EXPECT_EQ(nameIn(document), std::nullopt) << text;
+    }
+}
+
+TEST(Document, MayHaveAnyCharactersInStringsAndComments) {
+    for (const char* text :
+         {"name = \"\xC3\xA4\"", "name = '\xC3\xA4'", "name = \"\"\"\n\xC3\xA4\"\"\"", "name = '''\n\xC3\xA4'''",
+          "# \xD2\x97 \"\n\"n\\u0061me\" = \"\xC3\xA4\" # '\xC3\xA4", "\xEF\xBB\xBFname = \"\\u00e4\"",
+          "name = \"\"\"\\\n  \\u00e4\"\"\"", "other = ''\nquotes = \"\"\"\"\"\"\"\"\nname = '\xC3\xA4'"}) {
+        const Document document = Document::parse(text, "");
+        EXPECT_EQ(document.problem(), "") << text;
+        EXPECT_EQ(nameIn(document), "\xC3\xA4") << text;
+    }
+}
+
+TEST(Document, RefusesATextThatGoesOnAfterABackslashWithACharacterOutsideOfAscii) {
+    const Document document = Document::parse("name = \"\"\"\\\n\n  \xC2\xA7\"\"\"\n", "agent.toml");
+    EXPECT_THAT(document.problem(), StartsWith("agent.toml is not valid TOML (line 3: a text that goes on"));
+    EXPECT_EQ(nameIn(document), std::nullopt);
+}
+
+TEST(Document, RefusesTablesThatAreNestedSoDeepThatAStackWouldNotHoldThem) {
+    std::string parts = "a";
+    std::string tables = "a = ";
+    for (int depth = 0; depth < 200000; ++depth) {
+        parts += ".a";
+        tables += "{a = ";
+    }
+    for (const std::string& text : {parts + " = 1", "[" + parts + "]", tables}) {
+        EXPECT_THAT(Document::parse(text, "agent.toml").problem(), StartsWith("agent.toml is not valid TOML (line 1:"));
+    }
+}
+
 TEST(Document, MayBeMoved) {
     Document document = Document::parse("name = 'x'", "");
     const Document moved = std::move(document);
