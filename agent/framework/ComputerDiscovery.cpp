@@ -99,14 +99,19 @@ std::string tidy(std::string_view text) {
     return tidied;
 }
 
+/** The text as it can be shown; empty if it says nothing. */
+std::string meaningful(std::string_view text) {
+    std::string tidied = tidy(text);
+    return isPlaceholder(tidied) ? std::string() : tidied;
+}
+
 /** The text of a DMI file; empty if the file is absent or unreadable, or says nothing. */
 std::string readDmi(const std::string& path, Agent::Problems& problems) {
     const Agent::FileContent file = Agent::readFile(path);
     if (file.error != 0 && !file.absent()) {
         problems.push_back(path + " cannot be read: " + Agent::errorText(file.error));
     }
-    const std::string text = tidy(file.text);
-    return isPlaceholder(text) ? std::string() : text;
+    return meaningful(file.text);
 }
 
 std::string orElse(std::string text, const char* fallback) {
@@ -127,7 +132,7 @@ std::string chassisWord(const std::string& text) {
 /** "model - suffix". Readers cut the name at its first dash, so the model must not have one. */
 std::string productName(std::string model, const std::string& chassis) {
     std::replace(model.begin(), model.end(), '-', ' ');
-    return orElse(tidy(model), "Computer") + " - " + orElse(chassisWord(chassis), "Computer");
+    return orElse(meaningful(model), "Computer") + " - " + orElse(chassisWord(chassis), "Computer");
 }
 
 }  // namespace

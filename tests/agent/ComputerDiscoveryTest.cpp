@@ -92,6 +92,13 @@ TEST_F(ComputerDiscoveryTest, FallsBackWhenTheModelIsNothingButDashes) {
     EXPECT_EQ(computer().at(productProperty), "Computer - Computer");
 }
 
+TEST_F(ComputerDiscoveryTest, TakesAModelForNothingThatSaysNothingWithoutItsDashes) {
+    for (const char* text : {"none-", "-- Unknown", "to-be-filled-by-o.e.m."}) {
+        dmi.write("product_name", std::string(text) + "\n");
+        EXPECT_EQ(computer().at(productProperty), "Computer - Computer") << text;
+    }
+}
+
 TEST_F(ComputerDiscoveryTest, MakesBlanksOfBytesThatAreNoText) {
     dmi.write("sys_vendor", "Caf\xC3\xA9 \xFF\xFF Ltd\x01\n");
     EXPECT_EQ(computer().at(vendorProperty), "Caf\xC3\xA9 Ltd");
