@@ -47,11 +47,12 @@ double realOf(const Literal& literal, CMPIType type) {
 
 template <typename Real>
 Scalar realScalar(const Literal& literal, CMPIType type) {
-    const double value = realOf(literal, type);
-    if (!std::isfinite(value) || std::fabs(value) > static_cast<double>(std::numeric_limits<Real>::max())) {
+    static_assert(std::numeric_limits<Real>::is_iec559);  // what is too large becomes infinite
+    const Real value = static_cast<Real>(realOf(literal, type));
+    if (!std::isfinite(value)) {
         refuse(literal, type, "it is out of range");
     }
-    return static_cast<Real>(value);
+    return value;
 }
 
 const std::string& textOf(const Literal& literal, CMPIType type, const std::string& remedy) {

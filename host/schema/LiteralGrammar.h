@@ -36,7 +36,7 @@ struct DecimalLiteral
     : peg::seq<peg::opt<Sign>, peg::sor<peg::one<'0'>, peg::seq<peg::range<'1', '9'>, peg::star<peg::digit>>>,
                NumberEnd> {};
 
-struct UnitEscape : peg::seq<peg::one<'x', 'X'>, peg::rep_min_max<1, 4, peg::xdigit>> {};
+struct UnitEscape : peg::seq<peg::one<'x', 'X'>, peg::xdigit, peg::rep_opt<3, peg::xdigit>> {};
 struct Escape : peg::seq<peg::one<'\\'>, peg::sor<UnitEscape, peg::one<'b', 't', 'n', 'f', 'r', '"', '\'', '\\'>>> {};
 
 struct CharacterContent : peg::sor<Escape, peg::utf8::not_one<'\'', '\\', '\n', '\r'>> {};

@@ -92,6 +92,9 @@ std::string unescaped(std::string_view content) {
         }
         char c = content.front();
         content.remove_prefix(1);
+        if (c == '\0') {
+            throw ValueError("a string cannot hold a null character");
+        }
         if (c == '\\' && !content.empty()) {
             for (const Escape& escape : escapes) {
                 c = escape.code == content.front() ? escape.character : c;

@@ -11,8 +11,8 @@ std::string inQuotes(std::string_view text);
 
 /**
  * The text that a string literal stands for, given what is between its quotation marks. \x escapes are UTF-16
- * units, of which two may make one character. ValueError for half of such a pair and for \x0, which no provider
- * could be given. Other escapes than MOF's must not be there.
+ * units, of which two may make one character. ValueError for half of such a pair and for a null character, be it
+ * written as \x0 or as itself, which no provider could be given. Other escapes than MOF's must not be there.
  */
 std::string unescaped(std::string_view content);
 

@@ -109,6 +109,11 @@ const BadMof meaning[] = {
 };
 INSTANTIATE_TEST_SUITE_P(Meaning, MofError, testing::ValuesIn(meaning), nameOf);
 
+TEST(MofErrorOfBytes, ANullCharacterIsNoPartOfAString) {
+    using namespace std::string_literals;
+    EXPECT_THAT(refusalOf("class C { string A = \"a\0\"; };"s), StartsWith("test.mof:1:22: a string cannot hold"));
+}
+
 TEST(MofFile, AMissingFileAndADirectoryAreErrors) {
     const TemporaryDirectory directory;
     Schema schema;

@@ -29,6 +29,29 @@ TEST(MofWriter, WhatMofHasNoWordForIsNull) {
     EXPECT_EQ(formatMof(singleValue(CMPI_ref, std::shared_ptr<const ObjectPath>())), "NULL");
 }
 
+TEST(MofWriter, AControlCharacterBeforeAHexadecimalDigitIsReadBack) {
+    const std::string text =
+        "\x01"
+        "2\x7F"
+        "f";
+    const std::string written = formatMof(singleValue(CMPI_string, text));
+    const Schema schema = schemaOf("class C { string A = " + written + "; };");
+    EXPECT_EQ(formatMof(schema.findClass("C")->properties.front().defaultValue), written);
+}
+
+TEST(MofWriter, TheLargestRealNumbersAreReadBack) {
+    const char* text =
+        "class C { [Key] real32 A; real64 B; };"
+        "instance of C { A = -3.4028234663852886e38; B = 1.7976931348623157e308; };";
+    Schema schema;
+    MofReader(schema).readText(text, "numbers");
+    const std::string written = formatMof(schema.instances().front());
+    MofReader(schema).readText(written, "again");
+    const auto& again = schema.instances().back().properties;
+    EXPECT_EQ(std::get<float>(again[0].value.elements[0]), -std::numeric_limits<float>::max());
+    EXPECT_EQ(std::get<double>(again[1].value.elements[0]), std::numeric_limits<double>::max());
+}
+
 TEST(MofWriter, EmbedsAnInstanceAsAString) {
     const auto inner = std::make_shared<const Instance>(
         Instance{{"", "", "Inner", {}}, {{"Text", singleValue(CMPI_string, std::string("x"))}}});

@@ -70,6 +70,7 @@ TEST(ObjectPath, StringKeysTakeEscapesAndAnyOtherByte) {
     const auto text = [](const std::string& path) { return element<std::string>(parse(path).keys.at(0).value); };
     EXPECT_EQ(text(R"(Disk.ID="a\"b\\c")"), "a\"b\\c");
     EXPECT_EQ(text(R"(Disk.ID="")"), "");
+    EXPECT_EQ(text(R"(Disk.ID="\x00411\x1\x2z")"), "A1\x01\x02z");
     EXPECT_EQ(text("Disk.ID=\"a\nb\xFF,c=\\x0041\""), "a\nb\xFF,c=A");
 }
 
@@ -185,6 +186,11 @@ INSTANTIATE_TEST_SUITE_P(
                     BadPath{"//host", "character 7: expected / after"}, BadPath{"http://h/r:Disk", "character 6"},
                     BadPath{"1Disk", "character 1"}, BadPath{"Disk.ID==\"x\"", "character 9"},
                     BadPath{"Disk.ID=\"\\xD800\"", "half a character"}, BadPath{"Disk.ID=\"\\x0\"", "\\x0"}));
+
+TEST(ObjectPathError, ANullCharacterIsNoPartOfAKey) {
+    using namespace std::string_view_literals;
+    EXPECT_NE(refusal(std::string("Disk.ID=\"a\0b\""sv)), "");
+}
 
 TEST(ObjectPathError, DeepNestingAndLongTextsAreRefusedInGoodTime) {
     std::string nested = "Disk.ID=";
