@@ -19,11 +19,12 @@ std::string& root() {
 
 void writeConfiguration(const fs::path& file) {
     const std::string version = &agentVersion != nullptr ? agentVersion : "4.2.0";
+    const std::string log = &agentHasNoLog != nullptr ? "none" : logFile().string();
     std::ofstream stream(file);
     stream << "[directories]\ninstall = \"" << installDirectory().string() << "\"\ndata = \""
            << dataDirectory().string() << "\"\n[product]\nname = \"Test Agent\"\nversion = \"" << version << "\"\n"
            << "build_number = \"77\"\nidentifying_number = \"ID-1\"\nvendor = \"VEL\"\n"
-           << "[log]\ndestination = \"" << logFile().string() << "\"\nlog_level = 9999\ntrace_level = 9999\n"
+           << "[log]\ndestination = \"" << log << "\"\nlog_level = 9999\ntrace_level = 9999\n"
            << "rotation_size = 2147483647\n"
            << "[instrumentation]\ndiscover = false\n"
            << agentNodes;

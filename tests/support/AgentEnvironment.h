@@ -14,6 +14,9 @@
  */
 extern const char* const agentNodes;
 
+/** A program that defines it likewise has no log: what a log would say is not what it is about, or far too much. */
+extern const bool agentHasNoLog __attribute__((weak));
+
 /** The version of the agent product, for programs that define it likewise; "4.2.0" in all others. */
 extern const char* const agentVersion __attribute__((weak));
 

@@ -1,4 +1,4 @@
-#include "RecordModel.h"
+#include "RecordFixture.h"
 
 #include <algorithm>
 
@@ -166,7 +166,7 @@ TEST_P(DataFileTest, LinesEndedAsOnOtherSystemsAreReadAlike) {
 }
 
 TEST_P(DataFileTest, ANumberThatIsNoneEndsTheReadingAndLaterRecordsRepeatWhatWasRead) {
-    RecordModel model(kind());
+    testsupport::RecordModel model(kind().fields());
     model.records = {model.newRecord("A"), model.newRecord("B"), model.newRecord("C")};
     const std::string sound = model.written();
     const std::size_t second = sound.find("\nB\n") + 3;

@@ -1,4 +1,4 @@
-#include "RecordModel.h"
+#include "RecordFixture.h"
 
 #include <algorithm>
 #include <fstream>
@@ -12,7 +12,10 @@ namespace contract {
 namespace {
 
 using testing::IsEmpty;
+using testsupport::Form;
+using testsupport::ModelRecord;
 using testsupport::named;
+using testsupport::RecordModel;
 using testsupport::text;
 
 /** A text with all that is special, repeated up to a length. */
@@ -98,7 +101,7 @@ std::vector<std::string> malformedLogLines() {
 
 class HostileTextTest : public RecordTest {
 protected:
-    HostileTextTest() : model(kind()) {}
+    HostileTextTest() : model(kind().fields()) {}
 
     /** @name Requests, done to the model as well */
     ///@{

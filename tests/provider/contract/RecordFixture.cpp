@@ -47,6 +47,10 @@ const RecordClass warranty{
     "Could not open Warranty record.",
 };
 
+const testsupport::ModelFields& RecordClass::fields() const {
+    return className == std::string(lease.className) ? testsupport::leaseFields() : testsupport::warrantyFields();
+}
+
 std::vector<std::string> RecordClass::shownRecord(const std::string& instanceId,
                                                   const std::vector<std::string>& changed) const {
     std::vector<std::string> properties = defaultProperties;

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "ProviderFixture.h"
+#include "support/RecordModel.h"
 
 #include <ostream>
 #include <string>
@@ -25,6 +26,9 @@ struct RecordClass {
     const char* notAvailable;
     const char* identify;
     const char* cannotOpen;
+
+    /** The fields of a record in the file, for a model of it. */
+    const testsupport::ModelFields& fields() const;
 
     /** The lines of a new record in the file. */
     std::string newRecord(const std::string& storedIdentifier) const { return storedIdentifier + "\n" + defaultFields; }

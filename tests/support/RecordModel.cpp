@@ -1,31 +1,20 @@
-#include "RecordModel.h"
+#include "support/RecordModel.h"
 
 #include <algorithm>
 #include <cstdint>
 #include <limits>
-#include <regex>
 
 #include "schema/MofWriter.h"
+#include "schema/Text.h"
+#include "support/Values.h"
 
-namespace contract {
+namespace testsupport {
 
 namespace {
 
 constexpr const char* noDate = "00000000000000.000000-000";
 constexpr const char* whiteSpace = " \t\n\v\f\r";
 constexpr const char* digits = "0123456789";
-
-// clang-format off
-const std::vector<ModelField> leaseFields{
-    {"InstanceID", Form::identifier}, {"Lessor", Form::text}, {"BaseTermCommencementDate", Form::date},
-    {"LeaseTerm", Form::number}, {"EarlyTerminationOption", Form::flag}, {"FixedPricePurchaseOption", Form::flag},
-    {"RenewalOption", Form::flag}, {"BargainRenewalOption", Form::flag}, {"BaseRent", Form::text},
-    {"FairMarketRental", Form::text}, {"FairMarketValue", Form::text}, {"TerminationValue", Form::text},
-    {"NetMonthlyLeaseRateFactor", Form::number}};
-const std::vector<ModelField> warrantyFields{
-    {"InstanceID", Form::identifier}, {"Warrantor", Form::text}, {"WarrantyStartDate", Form::date},
-    {"WarrantyDuration", Form::number}};
-// clang-format on
 
 std::string lineOf(Form form, std::string value) {
     if (form == Form::date) {
@@ -53,12 +42,12 @@ std::string valueOf(Form form, std::string word) {
 /** Takes words and numbers off a text; once it has failed it gives nothing more. */
 class Scanner {
 public:
-    explicit Scanner(const std::string& content) : text(content) {}
+    explicit Scanner(std::string_view content) : text(content) {}
 
     /** Reads over the value what stands there next, if it is of that form. */
     void take(Form form, std::string& value) {
         if (form == Form::number || form == Form::flag) {
-            takeNumber(form == Form::flag ? 1 : std::numeric_limits<std::uint32_t>::max(), value);
+            takeNumber(form, value);
         } else {
             takeWord(value);
         }
@@ -68,20 +57,25 @@ private:
     void takeWord(std::string& value) {
         if (skipToNext()) {
             const std::size_t end = std::min(text.find_first_of(whiteSpace, position), text.size());
-            value = text.substr(position, end - position);
+            value = std::string(text.substr(position, end - position));
             position = end;
         }
     }
 
-    void takeNumber(std::uint64_t largest, std::string& value) {
+    void takeNumber(Form form, std::string& value) {
         if (!skipToNext()) {
             return;
         }
+        const bool isNegative = text[position] == '-';
+        position += form == Form::flag && (isNegative || text[position] == '+') ? 1 : 0;
         const std::size_t end = std::min(text.find_first_not_of(digits, position), text.size());
         std::uint64_t number = 0;
         for (std::size_t at = position; at < end; ++at) {
             number = std::min<std::uint64_t>(number * 10 + static_cast<std::uint64_t>(text[at] - '0'), 1ULL << 40U);
         }
+        const std::uint64_t largest = form == Form::number ? std::numeric_limits<std::uint32_t>::max()
+                                      : isNegative         ? 0
+                                                           : 1;
         hasFailed = end == position || number > largest;
         position = end;
         if (!hasFailed) {
@@ -96,30 +90,50 @@ private:
         return !hasFailed;
     }
 
-    const std::string& text;
+    std::string_view text;
     std::size_t position = 0;
     bool hasFailed = false;
 };
 
-/** What the property shows for a value, as MOF. */
+/** Whether a datetime property can have the text: a date or an interval without asterisks. */
+bool isShownDate(const std::string& text) {
+    return cimhost::isDateTime(text) && text.find('*') == std::string::npos;
+}
+
+/** What the property shows for a value, as MOF. An object manager gets no character after a null. */
 std::string shownValue(Form form, const std::string& value) {
-    static const std::regex date(R"([0-9]{14}\.[0-9]{6}[+-][0-9]{3})");
     switch (form) {
         case Form::number:
             return value;
         case Form::flag:
             return value == "1" ? "TRUE" : "FALSE";
         case Form::date:
-            return value != noDate && std::regex_match(value, date) ? '"' + value + '"' : "NULL";
+            return isShownDate(value) ? '"' + value + '"' : "NULL";
         default:
-            return cimhost::formatMof(testsupport::text(value));
+            return cimhost::formatMof(text(value.c_str()));
     }
 }
 
 }  // namespace
 
-RecordModel::RecordModel(const RecordClass& kind)
-    : fields(std::string(kind.name) == "Lease" ? leaseFields : warrantyFields) {}
+// clang-format off
+const ModelFields& leaseFields() {
+    static const ModelFields fields{
+        {"InstanceID", Form::identifier}, {"Lessor", Form::text}, {"BaseTermCommencementDate", Form::date},
+        {"LeaseTerm", Form::number}, {"EarlyTerminationOption", Form::flag}, {"FixedPricePurchaseOption", Form::flag},
+        {"RenewalOption", Form::flag}, {"BargainRenewalOption", Form::flag}, {"BaseRent", Form::text},
+        {"FairMarketRental", Form::text}, {"FairMarketValue", Form::text}, {"TerminationValue", Form::text},
+        {"NetMonthlyLeaseRateFactor", Form::number}};
+    return fields;
+}
+
+const ModelFields& warrantyFields() {
+    static const ModelFields fields{
+        {"InstanceID", Form::identifier}, {"Warrantor", Form::text}, {"WarrantyStartDate", Form::date},
+        {"WarrantyDuration", Form::number}};
+    return fields;
+}
+// clang-format on
 
 ModelRecord RecordModel::newRecord(const std::string& instanceId) const {
     ModelRecord record;
@@ -154,7 +168,13 @@ std::string RecordModel::written() const {
     return content;
 }
 
-void RecordModel::read(const std::string& content) {
+std::size_t RecordModel::announcedIn(std::string_view content) {
+    std::string count = "0";
+    Scanner(content).take(Form::number, count);
+    return std::stoul(count);
+}
+
+void RecordModel::read(std::string_view content) {
     Scanner scanner(content);
     std::string count = "0";
     scanner.take(Form::number, count);
@@ -171,19 +191,23 @@ void RecordModel::read(const std::string& content) {
     }
 }
 
+std::vector<std::string> RecordModel::shown(const ModelRecord& record) const {
+    std::vector<std::string> values;
+    for (std::size_t index = 0; index < fields.size(); ++index) {
+        values.push_back(std::string(fields[index].property) + "=" + shownValue(fields[index].form, record[index]));
+    }
+    return values;
+}
+
 std::vector<std::vector<std::string>> RecordModel::shownRecords() const {
     std::vector<std::vector<std::string>> all;
     for (const ModelRecord& record : records) {
-        std::vector<std::string> values;
-        for (std::size_t index = 0; index < fields.size(); ++index) {
-            values.push_back(std::string(fields[index].property) + "=" + shownValue(fields[index].form, record[index]));
-        }
-        all.push_back(std::move(values));
+        all.push_back(shown(record));
     }
     return all;
 }
 
-std::vector<std::string> RecordModel::shownFields(const Instance& instance) const {
+std::vector<std::string> RecordModel::shownFields(const cimhost::Instance& instance) const {
     std::vector<std::string> values;
     for (const ModelField& field : fields) {
         const cimhost::Value* value = testsupport::find(instance.properties, field.property);
@@ -192,4 +216,4 @@ std::vector<std::string> RecordModel::shownFields(const Instance& instance) cons
     return values;
 }
 
-}  // namespace contract
+}  // namespace testsupport

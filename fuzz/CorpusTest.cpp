@@ -1,0 +1,43 @@
+#include "Target.h"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <filesystem>
+#include <vector>
+
+#include "support/Files.h"
+
+// Takes a fuzzer's kept inputs through it, built as the other tests are and without the fuzzing engine.
+
+namespace {
+
+std::vector<std::filesystem::path> keptInputs() {
+    std::vector<std::filesystem::path> files;
+    for (const auto& entry : std::filesystem::directory_iterator(FUZZ_CORPUS)) {
+        files.push_back(entry.path());
+    }
+    std::sort(files.begin(), files.end());
+    return files;
+}
+
+void tryInput(const std::string& input) {
+    try {
+        LLVMFuzzerTestOneInput(reinterpret_cast<const std::uint8_t*>(input.data()), input.size());
+    } catch (const std::exception& violation) {
+        ADD_FAILURE() << violation.what();
+    }
+}
+
+TEST(FuzzCorpusTest, FUZZ_NAME) {
+    const auto files = keptInputs();
+    ASSERT_FALSE(files.empty()) << FUZZ_CORPUS;
+    for (const auto& file : files) {
+        SCOPED_TRACE(file.filename());
+        tryInput(testsupport::readFile(file));
+    }
+    SCOPED_TRACE("empty input");
+    tryInput({});
+}
+
+}  // namespace

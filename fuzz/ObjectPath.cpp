@@ -1,0 +1,70 @@
+#include "schema/ObjectPathText.h"
+
+#include "Target.h"
+
+#include "schema/Errors.h"
+#include "schema/MofReader.h"
+#include "schema/Names.h"
+
+#include <string>
+
+// Object paths: a text is refused with a PathError, or its path's text is one from which the same path is read.
+
+namespace {
+
+using fuzz::require;
+using fuzz::requireSame;
+
+constexpr const char* nameSpace = "root/cimv2";
+
+/** Classes with a key of every type, and the classes of the provider's kind. */
+constexpr const char* classes = R"(
+class Every {
+    [Key] boolean Flag; [Key] char16 Character; [Key] string Text; [Key] datetime Date;
+    [Key] uint8 U8; [Key] uint16 U16; [Key] uint32 U32; [Key] uint64 U64;
+    [Key] sint8 S8; [Key] sint16 S16; [Key] sint32 S32; [Key] sint64 S64;
+    [Key] real32 R32; [Key] real64 R64; [Key] Named REF Other; string Plain;
+};
+class Named { [Key] string Name; };
+class NamedMore : Named { string More; };
+[Association] class Link { [Key] Named REF Left; [Key] Every REF Right; };
+class Keyless { string Plain; };
+)";
+
+const cimhost::Schema& schema() {
+    static cimhost::Schema known;
+    if (known.classes().empty()) {
+        cimhost::MofReader(known).readText(classes, "classes");
+    }
+    return known;
+}
+
+void requireSound(const cimhost::ObjectPath& path) {
+    require(cimhost::isName(path.className), "a path has a class");
+    require(!path.nameSpace.empty(), "a path has a namespace");
+    for (const cimhost::NamedValue& key : path.keys) {
+        require(cimhost::isName(key.name), "a key has a name");
+        require(!key.value.isNull && key.value.elements.size() == 1, "a key has a value");
+    }
+}
+
+}  // namespace
+
+int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
+    cimhost::ObjectPath path;
+    try {
+        path = cimhost::parseObjectPath(fuzz::textOf(data, size), schema(), nameSpace);
+    } catch (const cimhost::PathError&) {
+        return 0;
+    }
+    requireSound(path);
+    const std::string text = cimhost::formatObjectPath(path);
+    const cimhost::ObjectPath again = cimhost::parseObjectPath(text, schema(), "root/other");
+    requireSound(again);
+    requireSame(cimhost::formatObjectPath(again), text, "path that was written and read");
+    requireSame(again.keys.size(), path.keys.size(), "keys of a path that was written and read");
+    for (std::size_t key = 0; key < path.keys.size(); ++key) {
+        require(again.keys[key].value.type == path.keys[key].value.type, "a key has the type that it had");
+    }
+    return 0;
+}

@@ -1,0 +1,123 @@
+#pragma once
+
+#include "MemoryFile.h"
+#include "Target.h"
+
+#include "RecordTable.h"
+#include "support/RecordModel.h"
+
+#include <string>
+#include <string_view>
+#include <variant>
+#include <vector>
+
+// What the fuzzers of the two record files share.
+
+namespace fuzz {
+
+/** Announcements of more records are believed, and only cost time; those of so many that no memory holds them are not.
+ */
+constexpr std::size_t mostRecords = 40;
+constexpr std::size_t hopelesslyMany = std::size_t{1} << 31U;
+
+/** A record of the store in the model's form. */
+template <class Store>
+testsupport::ModelRecord modelOf(const typename Store::Unit& unit) {
+    testsupport::ModelRecord record;
+    for (const auto& field : Store::fields) {
+        record.push_back(std::visit(
+            [&](auto member) -> std::string {
+                if constexpr (std::is_same_v<decltype(member), std::string Store::Unit::*>) {
+                    return unit.*member;
+                } else {
+                    return std::to_string(unit.*member);
+                }
+            },
+            field.member));
+    }
+    return record;
+}
+
+/** A record file, read by the store and by the model. */
+template <class Store>
+class RecordFile {
+public:
+    RecordFile(MemoryFile& itsFile, const testsupport::ModelFields& fields) : file(itsFile), model(fields) {}
+
+    /** Reads what the file holds, which both must read alike. */
+    void load() {
+        count = 0;
+        table.clear();
+        KO::LeaseWarrantyProvider::loadRecords(file.path(), count, table);
+        model.read(file.content());
+        std::vector<testsupport::ModelRecord> found;
+        for (const auto& unit : table) {
+            found.push_back(modelOf<Store>(unit));
+        }
+        requireSame<std::size_t>(found.size(), model.records.size(), "number of records read");
+        requireSame<std::size_t>(count, found.size(), "count of records");
+        for (std::size_t index = 0; index < found.size(); ++index) {
+            for (std::size_t field = 0; field < model.fields.size(); ++field) {
+                requireSame(found[index][field], model.records[index][field],
+                            "record " + std::to_string(index) + ", " + model.fields[field].property);
+            }
+        }
+    }
+
+    /** Rewrites the file from what was read, which both must write alike. @return its content */
+    std::string rewrite() {
+        require(KO::LeaseWarrantyProvider::writeRecords(file.path(), count, table), "the file is rewritten");
+        const std::string content = file.content();
+        requireSame(content, model.written(), "rewritten file");
+        return content;
+    }
+
+    bool hasEmptyIdentifier() const {
+        for (const auto& record : model.records) {
+            if (record.front().empty()) {
+                return true;
+            }
+        }
+        return false;
+    }
+
+private:
+    MemoryFile& file;
+    testsupport::RecordModel model;
+    unsigned int count = 0;
+    std::vector<typename Store::Unit> table{};
+};
+
+template <class Store>
+void requireNothingIsRead(const MemoryFile& file) {
+    unsigned int count = 0;
+    std::vector<typename Store::Unit> table;
+    KO::LeaseWarrantyProvider::loadRecords(file.path(), count, table);
+    require(count == 0 && table.empty(), "records that no memory holds are not read");
+}
+
+/** Any content is read as the rules of the format say, and a file that was written is read and rewritten the same. */
+template <class Store>
+int tryRecordFile(const testsupport::ModelFields& fields, std::string_view input) {
+    static MemoryFile file;
+    file.fill(input);
+    const std::size_t announced = testsupport::RecordModel::announcedIn(input);
+    if (announced >= hopelesslyMany) {
+        requireNothingIsRead<Store>(file);
+        return 0;
+    }
+    if (announced > mostRecords) {
+        return -1;
+    }
+    RecordFile<Store> records(file, fields);
+    records.load();
+    const std::string first = records.rewrite();
+    // An empty identifier makes an empty line, which is passed over: the fields shift.
+    const bool isStable = !records.hasEmptyIdentifier();
+    records.load();
+    const std::string second = records.rewrite();
+    require(!isStable || second == first, "a file that was written stays as it is");
+    return 0;
+}
+
+}  // namespace fuzz

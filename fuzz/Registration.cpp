@@ -1,0 +1,75 @@
+#include "schema/Registration.h"
+
+#include "Target.h"
+
+#include "schema/Errors.h"
+#include "schema/Names.h"
+
+#include <algorithm>
+#include <sstream>
+#include <string>
+#include <vector>
+
+// Registration files: what they hold is refused with a LoadError or understood, and then reads the same once written.
+
+namespace {
+
+using cimhost::ProviderRegistration;
+using fuzz::require;
+using fuzz::requireSame;
+using Registrations = std::vector<ProviderRegistration>;
+
+std::string lineIfAny(const char* keyword, const std::string& value) {
+    return value.empty() ? std::string() : std::string("  ") + keyword + ": " + value + "\n";
+}
+
+std::string written(const ProviderRegistration& registration) {
+    std::string types = registration.instance ? " instance" : "";
+    types += registration.association ? " association" : "";
+    std::string text = "[" + registration.className + "]\n";
+    text += lineIfAny("provider", registration.provider) + lineIfAny("location", registration.location);
+    text += lineIfAny("type", types);
+    for (const std::string& nameSpace : registration.nameSpaces) {
+        text += lineIfAny("namespace", nameSpace);
+    }
+    return text + lineIfAny("group", registration.group) + lineIfAny("unload", registration.unload);
+}
+
+std::string written(const Registrations& registrations) {
+    std::string text;
+    for (const ProviderRegistration& registration : registrations) {
+        text += written(registration);
+    }
+    return text;
+}
+
+Registrations read(const std::string& text) {
+    std::istringstream stream(text);
+    return cimhost::readRegistrations(stream, "input");
+}
+
+void requireComplete(const ProviderRegistration& registration) {
+    require(cimhost::isName(registration.className), "a class has a name");
+    require(!registration.provider.empty() && !registration.location.empty(), "a class has a provider");
+    require(!registration.nameSpaces.empty(), "a class has a namespace");
+    require(registration.source.rfind("input:", 0) == 0, "a stanza knows where it stands");
+}
+
+}  // namespace
+
+int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
+    const std::string text(fuzz::textOf(data, size));
+    Registrations registrations;
+    try {
+        registrations = read(text);
+    } catch (const cimhost::LoadError& error) {
+        require(std::string(error.what()).rfind("input:", 0) == 0, "an error begins with where it is");
+        return 0;
+    }
+    std::for_each(registrations.begin(), registrations.end(), requireComplete);
+    const auto brackets = static_cast<std::size_t>(std::count(text.begin(), text.end(), '['));
+    require(registrations.size() <= brackets, "every stanza has its head");
+    const std::string first = written(registrations);
+    requireSame(written(read(first)), first, "registrations that were written and read");
+    return 0;
+}
