@@ -97,7 +97,7 @@ void follow(const Request& request, const AssociationFilter& filter, Take take) 
         return;
     }
     const std::vector<Computer> computers = knownComputers(request);
-    const Provider provider(request.context);
+    const Provider provider(request);
     for (const Way& way : ways) {
         for (const Link& link : linksAlong(way, provider, computers, request.path)) {
             take(way, link, provider);
@@ -141,7 +141,7 @@ const CMPIInstance* associationInstance(const Request& request, const Class& ass
 
 std::vector<Link> allLinks(const Request& request, const Class& association) {
     const std::vector<Computer> computers = knownComputers(request);
-    return linksOf(Provider(request.context), computers, association);
+    return linksOf(Provider(request), computers, association);
 }
 
 /** The associations at the path, each made by a function of its class and link. */

@@ -5,31 +5,28 @@
 
 #include <cxxabi.h>
 
-#include <atomic>
+#include <chrono>
 #include <exception>
 
 namespace gate {
 
 namespace {
 
-/** The broker of the latest factory call. */
-std::atomic<const CMPIBroker*> manager{nullptr};
-
-/** The one that the provider is connected to. */
-std::atomic<const CMPIBroker*> connected{nullptr};
+/** How long an end of the object manager waits for requests that wait for somebody else: up-calls, slow clients. */
+constexpr std::chrono::seconds patience{5};
 
 /**
- * Goes before the provider's own static objects, which were there first: from then on no request is let in, and none
- * is inside.
+ * Goes before the provider's own static objects, which were there first: from then on nobody is inside. Who is
+ * elsewhere needs none of them, and may wait for the very thread that ends the process.
  */
 const struct GateKeeper {
-    ~GateKeeper() { theGate.close(); }
+    ~GateKeeper() { theGate.close(std::chrono::seconds(0), Gate::Closing::forGood); }
 } gateKeeper;
 
-/** A status with its reason. */
-CMPIStatus statusOf(CMPIrc rc, const std::string& text) noexcept {
+/** A status with its reason, as far as memory and the broker allow. */
+CMPIStatus statusOf(const CMPIBroker* broker, CMPIrc rc, const char* text, const char* detail = "") noexcept {
     try {
-        return {rc, make<&CMPIBrokerEncFT::newString>(manager.load(), text.c_str())};
+        return {rc, make<&CMPIBrokerEncFT::newString>(broker, (std::string(text) + detail).c_str())};
     } catch (...) {
         return {rc, nullptr};
     }
@@ -37,54 +34,55 @@ CMPIStatus statusOf(CMPIrc rc, const std::string& text) noexcept {
 
 /** Runs what may fail; a status is all that leaves. */
 template <class Work>
-CMPIStatus guarded(Work work) {
+CMPIStatus guarded(const CMPIBroker* broker, Work work) {
     try {
         work();
         return {CMPI_RC_OK, nullptr};
     } catch (const abi::__forced_unwind&) {
         throw;  // the thread is being ended: no exception, and not to be stopped
     } catch (const Failure& failure) {
-        return statusOf(failure.rc, failure.text);
+        return statusOf(broker, failure.rc, failure.text.c_str());
     } catch (const std::exception& exception) {
-        return statusOf(CMPI_RC_ERR_FAILED, std::string("The request broke off: ") + exception.what());
+        return statusOf(broker, CMPI_RC_ERR_FAILED, "The request broke off: ", exception.what());
     } catch (...) {
-        return statusOf(CMPI_RC_ERR_FAILED, "The request broke off by an exception of an unknown kind.");
+        return statusOf(broker, CMPI_RC_ERR_FAILED, "The request broke off by an exception of an unknown kind.");
     }
 }
 
-/** A request's stay in the library. */
+/** A request's stay in the library, from before its first call of the broker to after its last one. */
 class Visit {
 public:
-    Visit() {
-        if (!theGate.arrive()) {
-            fail(CMPI_RC_ERR_FAILED, "The provider is shutting down. Ask again when the object manager has restarted.");
-        }
-    }
+    Visit() noexcept : isLetIn(theGate.arrive()) {}
     ~Visit() { theGate.depart(); }
     Visit(const Visit&) = delete;
     Visit& operator=(const Visit&) = delete;
+
+    const bool isLetIn;
 };
 
 template <class Operation>
 CMPIStatus serve(const CMPIContext* context, const CMPIResult* result, const CMPIObjectPath* path,
                  Operation operation) {
-    return guarded([&] {
-        const Visit visit;
-        operation(Request{manager.load(), context, result, path});
-    });
+    const Visit visit;
+    const CMPIBroker* broker = Provider::manager();
+    if (!visit.isLetIn || broker == nullptr) {
+        return statusOf(broker, CMPI_RC_ERR_FAILED, closedText);
+    }
+    return guarded(broker, [&] { operation(Request{broker, context, result, path}); });
 }
 
 /**
  * Idle, the library asks to stay: the provider's tables would be read again from files that keep less than memory.
- * When the object manager ends, the provider is told.
+ * When the object manager ends, it takes its broker along: no request may be left that calls it.
  */
 CMPIStatus cleanUp(const CMPIContext* context, CMPIBoolean terminating) {
     if (terminating == 0) {
-        return statusOf(CMPI_RC_DO_NOT_UNLOAD, "The provider keeps its tables in memory.");
+        return statusOf(Provider::manager(), CMPI_RC_DO_NOT_UNLOAD, "The provider keeps its tables in memory.");
     }
-    return guarded([&] {
-        const Visit visit;
-        Provider(context).cleanUp();
+    return guarded(Provider::manager(), [&] {
+        if (theGate.close(patience)) {
+            Provider::end(context);
+        }
     });
 }
 
@@ -123,7 +121,8 @@ CMPIStatus remove(CMPIInstanceMI*, const CMPIContext* context, const CMPIResult*
 
 CMPIStatus execQuery(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*, const char*,
                      const char*) {
-    return statusOf(CMPI_RC_ERR_NOT_SUPPORTED, "This provider answers no queries. Enumerate the class instead.");
+    return statusOf(Provider::manager(), CMPI_RC_ERR_NOT_SUPPORTED,
+                    "This provider answers no queries. Enumerate the class instead.");
 }
 
 CMPIStatus associationCleanup(CMPIAssociationMI*, const CMPIContext* context, CMPIBoolean terminating) {
@@ -184,27 +183,23 @@ CMPIAssociationMI associationInterface{nullptr, &associationFunctions};
 
 /**
  * Connects the provider to a broker, once: managers call factories again and again, maybe with a lock of theirs held,
- * and must not have to wait for requests then.
+ * and must not have to wait for requests then. A manager that ended and goes on opens the gate again.
  */
 void connect(const CMPIBroker* broker) {
-    if (broker == nullptr) {
-        fail(CMPI_RC_ERR_INVALID_PARAMETER, "There is no broker.");
-    }
-    manager = broker;
-    if (connected.load() == broker) {
-        return;
-    }
-    const Visit visit;
-    if (!Provider::connect(broker)) {
+    if (!Provider::isConnectedTo(broker) && !Provider::connect(broker)) {
         fail(CMPI_RC_ERR_FAILED, "The provider behind the gate does not give its interfaces.");
     }
-    connected = broker;
 }
 
 /** Answers an interface once the provider is connected; null, with the reason in the status, otherwise. */
 template <class Interface>
 Interface* open(const CMPIBroker* broker, CMPIStatus* rc, Interface& interface) {
-    const CMPIStatus status = guarded([&] { connect(broker); });
+    CMPIStatus status{CMPI_RC_ERR_INVALID_PARAMETER, nullptr};  // without a broker there are no words
+    if (broker != nullptr) {
+        theGate.open();
+        const Visit visit;
+        status = guarded(broker, [&] { connect(broker); });
+    }
     if (rc != nullptr) {
         *rc = status;
     }

@@ -1,5 +1,8 @@
 #include "Gate.h"
 
+#include <pthread.h>
+#include <unistd.h>
+
 namespace gate {
 
 namespace {
@@ -7,74 +10,141 @@ namespace {
 /** Requests that arrived on this thread and have not departed: those that closing must not wait for. */
 thread_local std::size_t arrivedHere = 0;
 
+/** Whether this thread has the turn, in which closing has to leave it. */
+thread_local bool isInsideHere = false;
+
 }  // namespace
 
 Gate theGate;
 
 struct Gate::Waiter {
-    std::condition_variable admission;
+    std::condition_variable call{};
     bool isAdmitted = false;
     Waiter* next = nullptr;
 };
 
 bool Gate::arrive() noexcept {
     const std::lock_guard<std::mutex> lock(mutex);
-    if (isClosed) {
-        return false;
-    }
+    process = getpid();
     ++arrived;
     ++arrivedHere;
-    return true;
+    return state == State::open;
 }
 
 void Gate::depart() noexcept {
     const std::lock_guard<std::mutex> lock(mutex);
     --arrived;
     --arrivedHere;
-    if (closing != nullptr) {
-        closing->notify_one();
-    }
+    tellClosers();
 }
 
-void Gate::enter() noexcept {
+bool Gate::enter() noexcept {
     std::unique_lock<std::mutex> lock(mutex);
-    if (!isTaken) {
-        isTaken = true;
-        return;
+    if (state != State::open) {
+        return false;
     }
-    Waiter self;
-    (first == nullptr ? first : last->next) = &self;
-    last = &self;
-    ++queued;
-    self.admission.wait(lock, [&] { return self.isAdmitted; });
+    waitForTurn(lock);
+    return true;
+}
+
+void Gate::comeBack() noexcept {
+    std::unique_lock<std::mutex> lock(mutex);
+    waitForTurn(lock);
+}
+
+void Gate::waitForTurn(std::unique_lock<std::mutex>& lock) {
+    if (!isTaken && state != State::shut) {
+        isTaken = true;
+    } else {
+        Waiter self;
+        (queue.first == nullptr ? queue.first : queue.last->next) = &self;
+        queue.last = &self;
+        ++queue.length;
+        self.call.wait(lock, [&] { return self.isAdmitted; });
+    }
+    isInsideHere = true;
 }
 
 void Gate::leave() noexcept {
     const std::lock_guard<std::mutex> lock(mutex);
-    if (first == nullptr) {
-        isTaken = false;
-        return;
-    }
-    // Handed over, not given up: who comes by just now cannot be quicker than who has waited.
-    Waiter& next = *first;
-    first = next.next;
-    --queued;
-    next.isAdmitted = true;
-    next.admission.notify_one();  // under the lock: the waiter lives until it has it
+    isInsideHere = false;
+    isTaken = false;
+    admitNext();
+    tellClosers();
 }
 
-void Gate::close() noexcept {
+/** Hands the turn over at once: who comes by just now cannot be quicker than who has waited. */
+void Gate::admitNext() {
+    if (queue.first == nullptr || state == State::shut) {
+        return;
+    }
+    Waiter& next = *queue.first;
+    queue.first = next.next;
+    --queue.length;
+    isTaken = true;
+    next.isAdmitted = true;
+    next.call.notify_one();  // under the lock: the waiter lives until it has it
+}
+
+bool Gate::isEmptyButForCaller() const {
+    return !isTaken || isInsideHere;
+}
+
+void Gate::tellClosers() {
+    for (Waiter* closer = closers; closer != nullptr; closer = closer->next) {
+        closer->call.notify_one();
+    }
+}
+
+bool Gate::close(std::chrono::milliseconds patience, Closing closing) noexcept {
+    const pid_t its = process;
+    if (its != 0 && its != getpid()) {
+        return false;  // the threads that have the lock and the turn are not in this process
+    }
+    const Uncancelled uncancelled;
     std::unique_lock<std::mutex> lock(mutex);
-    isClosed = true;
-    std::condition_variable departure;
-    closing = &departure;
-    departure.wait(lock, [&] { return arrived <= arrivedHere; });
-    closing = nullptr;
+    const bool wasOpen = state == State::open;
+    isForGood = isForGood || closing == Closing::forGood;
+    if (state == State::shut) {
+        return false;
+    }
+    state = State::closing;
+    Waiter self;
+    self.next = closers;
+    closers = &self;
+    self.call.wait_for(lock, patience, [&] { return arrived <= arrivedHere || state == State::shut; });
+    self.call.wait(lock, [&] { return isEmptyButForCaller(); });
+    state = State::shut;
+    Waiter** link = &closers;
+    while (*link != &self) {
+        link = &(*link)->next;
+    }
+    *link = self.next;
+    tellClosers();
+    return wasOpen;
+}
+
+void Gate::open() noexcept {
+    const std::lock_guard<std::mutex> lock(mutex);
+    if (state == State::shut && !isForGood) {
+        state = State::open;
+        if (!isTaken) {
+            admitNext();
+        }
+    }
 }
 
 std::size_t Gate::waiting() const noexcept {
     const std::lock_guard<std::mutex> lock(mutex);
-    return queued;
+    return queue.length;
+}
+
+Uncancelled::Uncancelled() noexcept {
+    pthread_setcancelstate(PTHREAD_CANCEL_DISABLE, &before);
+}
+
+Uncancelled::~Uncancelled() {
+    pthread_setcancelstate(before, &before);
 }
 
 }  // namespace gate

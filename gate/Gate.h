@@ -1,5 +1,11 @@
 #pragma once
 
+#include "Failure.h"
+
+#include <sys/types.h>
+
+#include <atomic>
+#include <chrono>
 #include <condition_variable>
 #include <cstddef>
 #include <mutex>
@@ -11,61 +17,111 @@ namespace gate {
  *
  * A request arrives, takes turns, and departs. In between it may take several turns, and lets others in while it waits
  * for the object manager (Pause). The lock is no thread's own: during a pause the same thread may come again with
- * another request. Once the gate closes no request arrives any more, those that have arrived are served to their end.
+ * another request.
+ *
+ * A gate that closes lets nobody in any more; who has a turn, waits for one or comes back from a pause is served. Once
+ * it is shut, nobody is inside, and who comes back from a pause waits for it to be opened again.
  *
  * It needs no destruction: a late request finds it as it was left.
  */
 class Gate {
 public:
+    enum class Closing { untilOpened, forGood };
+
     constexpr Gate() = default;
     Gate(const Gate&) = delete;
     Gate& operator=(const Gate&) = delete;
 
-    /** Whether the request is let in; if so, depart() has to follow. */
+    /** Whether the request is let in. In either case, depart() has to follow. */
     bool arrive() noexcept;
     void depart() noexcept;
 
-    /** Waits for the turn, behind all who came before. */
-    void enter() noexcept;
+    /** Waits for the turn, behind all who came before; false, and no turn, when the gate closes. */
+    bool enter() noexcept;
     /** Gives the turn to who has waited longest. */
     void leave() noexcept;
+    /** Waits for the turn after a leave() that only interrupted it. */
+    void comeBack() noexcept;
 
-    /** Lets no further request arrive and waits until all have departed but the calling thread's own. */
-    void close() noexcept;
+    /**
+     * Shuts the gate when nobody is inside or waits to be, but for the calling thread. Before that it gives the
+     * requests that have arrived some time to depart, no more: they may wait for who never answers.
+     * Does nothing in a process that was forked off from the one in which the requests are.
+     * @return whether the gate was open
+     */
+    bool close(std::chrono::milliseconds patience, Closing closing = Closing::untilOpened) noexcept;
+
+    /** Opens a gate that is shut, unless it is shut for good. */
+    void open() noexcept;
 
     /** How many wait for their turn. */
     std::size_t waiting() const noexcept;
 
 private:
+    enum class State { open, closing, shut };
     struct Waiter;
 
+    /** Who waits, in order; each waiter stands on the stack of its thread. */
+    struct Queue {
+        Waiter* first = nullptr;
+        Waiter* last = nullptr;
+        std::size_t length = 0;
+    };
+
+    void waitForTurn(std::unique_lock<std::mutex>& lock);
+    void admitNext();
+    bool isEmptyButForCaller() const;
+    void tellClosers();
+
     mutable std::mutex mutex{};
+    State state = State::open;
+    bool isForGood = false;
     bool isTaken = false;
-    bool isClosed = false;
     std::size_t arrived = 0;
-    std::size_t queued = 0;
-    Waiter* first = nullptr;  ///< the queue; each waiter stands on the stack of its thread
-    Waiter* last = nullptr;
-    std::condition_variable* closing = nullptr;  ///< who waits in close()
+    std::atomic<pid_t> process{0};  ///< in which the latest request arrived
+    Queue queue{};
+    Waiter* closers = nullptr;  ///< who waits in close()
 };
 
 /** The gate of this library: there is one provider behind it. */
 extern Gate theGate;
 
-/** A turn at the gate while it lives. */
+/** Keeps the thread from being cancelled while it lives: that would end the process, or cut a file in two. */
+class Uncancelled {
+public:
+    Uncancelled() noexcept;
+    ~Uncancelled();
+    Uncancelled(const Uncancelled&) = delete;
+    Uncancelled& operator=(const Uncancelled&) = delete;
+
+private:
+    int before = 0;
+};
+
+/** What a client is told that comes to a gate that closes. */
+constexpr const char* closedText = "The provider is shutting down. Ask again when the object manager has restarted.";
+
+/** A turn at the gate while it lives; CMPI_RC_ERR_FAILED when the gate closes. */
 class Turn {
 public:
-    Turn() noexcept { theGate.enter(); }
+    Turn() {
+        if (!theGate.enter()) {
+            fail(CMPI_RC_ERR_FAILED, closedText);
+        }
+    }
     ~Turn() { theGate.leave(); }
     Turn(const Turn&) = delete;
     Turn& operator=(const Turn&) = delete;
+
+private:
+    Uncancelled uncancelled;
 };
 
 /** Interrupts the turn that the caller has, while it lives. */
 class Pause {
 public:
     Pause() noexcept { theGate.leave(); }
-    ~Pause() { theGate.enter(); }
+    ~Pause() { theGate.comeBack(); }
     Pause(const Pause&) = delete;
     Pause& operator=(const Pause&) = delete;
 };

@@ -43,7 +43,7 @@ struct Target {
     const DataFile& file;
     OwnPath path;
 
-    const std::string& identifier() const { return path.key(identifierKey); }
+    std::string identifier() const { return path.key(identifierKey); }
 
     void requireStored() const {
         if (file.keepsRecords() && file.recordsOf(identifier()) == 0) {
@@ -119,7 +119,7 @@ void enumerateInstanceNames(const Request& request) {
         return enumerateAssociationNames(request, requested);
     }
     const OwnPath classPath(nameSpaceOf(request.path), requested.name);
-    const Provider::Paths paths = Provider(request.context).names(classPath);
+    const Provider::Paths paths = Provider(request).names(classPath);
     for (const CMPIObjectPath* path : paths) {
         request.give(path);
     }
@@ -133,7 +133,7 @@ void enumerateInstances(const Request& request, const char** properties) {
     }
     const OwnPath classPath(nameSpaceOf(request.path), requested.name);
     const PropertyList list(properties);
-    const Provider::Instances instances = Provider(request.context).instances(classPath);
+    const Provider::Instances instances = Provider(request).instances(classPath);
     for (const CMPIInstance* instance : instances) {
         request.give(list.applied(request.broker, instance, requested));
     }
@@ -146,7 +146,7 @@ void getInstance(const Request& request, const char** properties) {
         return getAssociation(request, requested);
     }
     const OwnPath path = namingPath(request.path, requested);
-    const CMPIInstance* instance = existing(Provider(request.context), path, requested);
+    const CMPIInstance* instance = existing(Provider(request), path, requested);
     request.give(PropertyList(properties).applied(request.broker, instance, requested));
     request.finish();
 }
@@ -161,7 +161,7 @@ void createInstance(const Request& request, const CMPIInstance* instance) {
     requireKept(file, given);
     OwnPath path(nameSpaceOf(request.path), requested.name);
     path.addKey(identifierKey, identifier);
-    create(request, Provider(request.context), {requested, file, std::move(path)}, given);
+    create(request, Provider(request), {requested, file, std::move(path)}, given);
 }
 
 void modifyInstance(const Request& request, const CMPIInstance* instance, const char** properties) {
@@ -172,7 +172,7 @@ void modifyInstance(const Request& request, const CMPIInstance* instance, const 
     list.requireKnown(requested);
     const Target target{requested, file, namingPath(request.path, requested)};
     const Values given = givenValues(requested, instance, list);
-    const Provider provider(request.context);
+    const Provider provider(request);
     const CMPIInstance* current = existing(provider, target.path, requested);
     const Values changes = changesTo(current, given);
     requireKept(file, changes);
@@ -186,7 +186,7 @@ void deleteInstance(const Request& request) {
     const Class& requested = request.requestedClass();
     const DataFile& file = fileOf(requested, true);
     const Target target{requested, file, namingPath(request.path, requested)};
-    const Provider provider(request.context);
+    const Provider provider(request);
     existing(provider, target.path, requested);
     file.requireWritable();
     const std::size_t before = file.recordsBefore(target.identifier());

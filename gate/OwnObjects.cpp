@@ -135,14 +135,13 @@ void OwnPath::addKey(const char* name, std::string value) {
     content->keys.emplace_back(name, CMPI_string, std::move(value));
 }
 
-const std::string& OwnPath::key(const char* name) const {
-    static const std::string none;
+std::string OwnPath::key(const char* name) const {
     for (const Member& member : content->keys) {
         if (sameName(member.name.characters, name)) {
             return member.value.characters;
         }
     }
-    return none;
+    return {};
 }
 
 const CMPIObjectPath* OwnPath::handle() const {

@@ -21,8 +21,8 @@ public:
 
     void addKey(const char* name, std::string value);
 
-    /** The value of a key that was added. */
-    const std::string& key(const char* name) const;
+    /** The value of a key; empty when it was not added. */
+    std::string key(const char* name) const;
 
     const CMPIObjectPath* handle() const;
 

@@ -5,6 +5,7 @@
 #include "WrappedBroker.h"
 
 #include <algorithm>
+#include <mutex>
 #include <optional>
 
 extern "C" {
@@ -24,6 +25,21 @@ struct Connection {
 };
 
 Connection connection;
+
+/** The object manager's broker once the provider is connected to it, with its tables as they were then. */
+struct Manager {
+    std::mutex mutex{};  ///< held for moments only: factories must not have to wait for requests
+    const CMPIBroker* broker = nullptr;
+    CMPIBroker tables{};
+
+    void set(const CMPIBroker* itsBroker) {
+        const std::lock_guard<std::mutex> lock(mutex);
+        broker = itsBroker;
+        tables = itsBroker == nullptr ? CMPIBroker{} : *itsBroker;
+    }
+};
+
+Manager connected;
 
 void requireOk(const CMPIStatus& status) {
     if (status.rc == CMPI_RC_OK) {
@@ -59,14 +75,39 @@ void answer(CapturedResult& result, Interface* interface, const CMPIContext* con
 
 bool Provider::connect(const CMPIBroker* manager) {
     const Turn turn;
-    if (!connection.broker || !connection.broker->wraps(manager)) {
-        connection.broker.emplace(manager);
-    }
+    connection.broker.emplace(manager);
     CMPIStatus status{CMPI_RC_OK, nullptr};
     const CMPIBroker* broker = connection.broker->handle();
     connection.instances = LeaseAndWarrantyProvider_Create_InstanceMI(broker, nullptr, &status);
     connection.associations = LeaseAndWarrantyProvider_Create_AssociationMI(broker, nullptr, &status);
-    return connection.instances != nullptr && connection.associations != nullptr;
+    const bool isConnected = connection.instances != nullptr && connection.associations != nullptr;
+    connected.set(isConnected ? manager : nullptr);
+    return isConnected;
+}
+
+bool Provider::isConnectedTo(const CMPIBroker* manager) {
+    const std::lock_guard<std::mutex> lock(connected.mutex);
+    const CMPIBroker& tables = connected.tables;
+    return connected.broker == manager && tables.bft == manager->bft && tables.eft == manager->eft &&
+           tables.xft == manager->xft && tables.mft == manager->mft;
+}
+
+const CMPIBroker* Provider::manager() {
+    const std::lock_guard<std::mutex> lock(connected.mutex);
+    return connected.broker;
+}
+
+Provider::Provider(const Request& request) : context(request.context) {
+    request.broker = manager();
+    require(request.broker != nullptr, "connect to the provider behind the gate");
+}
+
+void Provider::end(const CMPIContext* context) {
+    if (manager() != nullptr) {
+        connection.instances->ft->cleanup(connection.instances, context, 1);
+        connection.associations->ft->cleanup(connection.associations, context, 1);
+    }
+    connected.set(nullptr);
 }
 
 Provider::Paths Provider::names(const OwnPath& classPath) const {
@@ -126,11 +167,6 @@ Provider::Paths Provider::associatorNames(const OwnPath& path, const char* assoc
     answer<&CMPIAssociationMIFT::associatorNames>(result, connection.associations, context, path.handle(),
                                                   associationClass, any, any, any);
     return result.paths;
-}
-
-void Provider::cleanUp() const {
-    connection.instances->ft->cleanup(connection.instances, context, 1);
-    connection.associations->ft->cleanup(connection.associations, context, 1);
 }
 
 }  // namespace gate

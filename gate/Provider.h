@@ -3,6 +3,7 @@
 #include "CapturedResult.h"
 #include "Gate.h"
 #include "OwnObjects.h"
+#include "Request.h"
 
 #include <cmpift.h>
 
@@ -26,7 +27,16 @@ public:
     /** Tells the provider of its broker; false when it does not give its interfaces. */
     static bool connect(const CMPIBroker* manager);
 
-    explicit Provider(const CMPIContext* itsContext) : context(itsContext) {}
+    /** Whether the provider has this broker, with the tables that it has now. Waits for no turn. */
+    static bool isConnectedTo(const CMPIBroker* manager);
+
+    /** The broker that the provider has; null when there is none. Waits for no turn. */
+    static const CMPIBroker* manager();
+
+    /** Ends both interfaces, as the object manager does that ends itself, and forgets its broker. The gate is shut. */
+    static void end(const CMPIContext* context);
+
+    explicit Provider(const Request& request);
 
     Paths names(const OwnPath& classPath) const;
     Instances instances(const OwnPath& classPath) const;
@@ -39,9 +49,6 @@ public:
     void remove(const OwnPath& path) const;
 
     Paths associatorNames(const OwnPath& path, const char* associationClass) const;
-
-    /** Ends both interfaces, as the object manager does that ends itself. */
-    void cleanUp() const;
 
 private:
     bool isListed(const OwnPath& path) const;

@@ -11,7 +11,7 @@ constexpr const char* computerClass = "VELKO_ComputerSystem";
 
 /** One request: what the object manager passed, all of it borrowed. */
 struct Request {
-    const CMPIBroker* broker;  ///< the object manager's own
+    mutable const CMPIBroker* broker;  ///< the object manager's own: the one that the provider has, at each turn anew
     const CMPIContext* context;
     const CMPIResult* result;
     const CMPIObjectPath* path;

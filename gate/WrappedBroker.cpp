@@ -119,12 +119,6 @@ WrappedBroker::WrappedBroker(const CMPIBroker* manager)
       memory(wrapped(manager->mft)),
       // The thread functions name no broker: they are the object manager's own.
       broker{this, &services, &encapsulation, manager->xft, manager->mft == nullptr ? nullptr : &memory},
-      managersOwn(manager),
-      original(*manager) {}
-
-bool WrappedBroker::wraps(const CMPIBroker* manager) const {
-    return managersOwn == manager && original.bft == manager->bft && original.eft == manager->eft &&
-           original.xft == manager->xft && original.mft == manager->mft;
-}
+      managersOwn(manager) {}
 
 }  // namespace gate

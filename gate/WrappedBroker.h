@@ -23,9 +23,6 @@ public:
     /** The object manager's broker. */
     const CMPIBroker* manager() const { return managersOwn; }
 
-    /** Whether this wraps that broker, with the tables that it has now. */
-    bool wraps(const CMPIBroker* manager) const;
-
     /** @name Paths and instances that could not be made
      * The provider leaves such answers out without a word. Noted since the last forgetFailures().
      */
@@ -41,7 +38,6 @@ private:
     CMPIBrokerMemFT memory;
     CMPIBroker broker;
     const CMPIBroker* managersOwn;
-    CMPIBroker original;  ///< the tables that were wrapped
     bool failed = false;
 };
 

@@ -3,6 +3,13 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <pthread.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <atomic>
+#include <chrono>
 #include <condition_variable>
 #include <mutex>
 #include <string>
@@ -42,6 +49,9 @@ private:
     std::condition_variable changed;
     std::vector<std::string> events;
 };
+
+/** For those who close a gate and are not to wait in vain: it ends no test that goes well. */
+constexpr std::chrono::hours longEnough{1};
 
 /** Goes on when so many wait at the gate. */
 void awaitQueue(const Gate& gate, std::size_t length) {
@@ -160,51 +170,206 @@ TEST(TurnTest, WhoComesBackFromAPauseWaitsForWhoIsInside) {
     EXPECT_THAT(diary.all(), ElementsAre("pausing", "other in", "other out", "back"));
 }
 
+/** Goes on when the gate closes, whether or not it is shut. */
+void awaitClosing(Gate& gate) {
+    for (bool isOpen = true; isOpen; std::this_thread::yield()) {
+        isOpen = gate.arrive();
+        gate.depart();
+    }
+}
+
 TEST(TurnTest, AClosedGateLetsNobodyIn) {
     Gate gate;
     EXPECT_TRUE(gate.arrive());
     gate.depart();
-    gate.close();
+    EXPECT_TRUE(gate.close(longEnough));
     EXPECT_FALSE(gate.arrive());
+    gate.depart();
+    EXPECT_FALSE(gate.close(longEnough)) << "it was closed before";
 }
 
-TEST(TurnTest, ClosingWaitsForAllWhoHaveArrivedAlsoForThoseInTheQueue) {
+TEST(TurnTest, ClosingWaitsForWhoIsInsideAndForThoseInTheQueue) {
     Gate gate;
     Diary diary;
     std::vector<std::thread> threads;
     const auto request = [&](const std::string& name) {
-        ASSERT_TRUE(gate.arrive());
-        diary.note(name + " arrived");
-        gate.enter();
+        gate.arrive();
+        ASSERT_TRUE(gate.enter());
+        diary.note(name + " inside");
         if (name == "first") {
-            diary.note("inside");
-            diary.await("closing");
-            awaitQueue(gate, 1);
+            diary.await("go on");
         }
-        gate.leave();
         diary.note(name + " done");
+        gate.leave();
         gate.depart();
     };
     threads.emplace_back(request, "first");
-    diary.await("inside");
+    diary.await("first inside");
     threads.emplace_back(request, "second");
-    diary.await("second arrived");
+    awaitQueue(gate, 1);
     threads.emplace_back([&] {
-        diary.note("closing");
-        gate.close();
+        gate.close(longEnough);
         diary.note("closed");
     });
+    awaitClosing(gate);
+    EXPECT_THAT(diary.all(), ElementsAre("first inside"));
+    diary.note("go on");
     join(threads);
-    EXPECT_EQ(diary.all().back(), "closed");
-    EXPECT_EQ(diary.all().size(), 7U);
+    EXPECT_THAT(diary.all(),
+                ElementsAre("first inside", "go on", "first done", "second inside", "second done", "closed"));
+}
+
+TEST(TurnTest, ClosingHasNoPatienceWithWhoIsElsewhereAndWaitsForWhoIsInside) {
+    Gate gate;
+    Diary diary;
+    gate.arrive();
+    ASSERT_TRUE(gate.enter());
+    std::thread closer([&] {
+        gate.close(std::chrono::seconds(0));
+        diary.note("closed");
+    });
+    awaitClosing(gate);
+    diary.note("leaving");
+    gate.leave();
+    closer.join();
+    EXPECT_THAT(diary.all(), ElementsAre("leaving", "closed")) << "before it departs";
+    gate.depart();
+}
+
+TEST(TurnTest, AGateThatClosesGivesNoNewTurns) {
+    Gate gate;
+    ASSERT_TRUE(gate.arrive());
+    std::thread closer([&] { EXPECT_TRUE(gate.close(longEnough)); });
+    awaitClosing(gate);
+    EXPECT_FALSE(gate.enter());
+    gate.depart();
+    closer.join();
+}
+
+TEST(TurnTest, WhoComesBackFromAPauseWhileTheGateClosesIsServed) {
+    Gate gate;
+    ASSERT_TRUE(gate.arrive());
+    ASSERT_TRUE(gate.enter());
+    gate.leave();
+    std::thread closer([&] { EXPECT_TRUE(gate.close(longEnough)); });
+    awaitClosing(gate);
+    gate.comeBack();
+    gate.leave();
+    gate.depart();
+    closer.join();
+}
+
+TEST(TurnTest, WhoComesBackToAShutGateWaitsForItToBeOpened) {
+    Gate gate;
+    Diary diary;
+    std::thread late([&] {
+        gate.arrive();
+        EXPECT_TRUE(gate.enter());
+        gate.leave();
+        diary.note("pausing");
+        diary.await("shut");
+        gate.comeBack();
+        diary.note("back");
+        gate.leave();
+        gate.depart();
+    });
+    diary.await("pausing");
+    EXPECT_TRUE(gate.close(std::chrono::seconds(0)));
+    diary.note("shut");
+    awaitQueue(gate, 1);
+    diary.note("opened");
+    gate.open();
+    late.join();
+    EXPECT_THAT(diary.all(), ElementsAre("pausing", "shut", "opened", "back"));
+    EXPECT_TRUE(gate.arrive());
+    gate.depart();
+}
+
+TEST(TurnTest, AGateThatIsClosedForGoodIsNotOpenedAgain) {
+    Gate gate;
+    gate.close(longEnough);
+    gate.close(longEnough, Gate::Closing::forGood);
+    gate.open();
+    EXPECT_FALSE(gate.arrive());
+    gate.depart();
+}
+
+TEST(TurnTest, SeveralMayCloseTheGateAtATimeAndOneOfThemDoes) {
+    Gate gate;
+    std::atomic<int> closedBy{0};
+    ASSERT_TRUE(gate.arrive());
+    std::vector<std::thread> threads;
+    for (int number = 0; number < 4; ++number) {
+        threads.emplace_back([&] { closedBy += gate.close(longEnough) ? 1 : 0; });
+    }
+    awaitClosing(gate);
+    gate.depart();
+    join(threads);
+    EXPECT_EQ(closedBy, 1);
 }
 
 TEST(TurnTest, ClosingDoesNotWaitForTheCallingThreadsOwnRequest) {
     Gate gate;
     ASSERT_TRUE(gate.arrive());
-    gate.close();
-    EXPECT_FALSE(gate.arrive());
+    ASSERT_TRUE(gate.enter());
+    gate.close(longEnough);
+    EXPECT_FALSE(gate.enter());
+    gate.leave();
     gate.depart();
+}
+
+TEST(TurnTest, AForkedChildThatEndsWaitsForNobody) {
+    Gate gate;
+    Diary diary;
+    std::thread inside([&] {
+        gate.arrive();
+        EXPECT_TRUE(gate.enter());
+        diary.note("inside");
+        diary.await("forked");
+        gate.leave();
+        gate.depart();
+    });
+    diary.await("inside");
+    const pid_t child = fork();
+    if (child == 0) {
+        alarm(60);  // the only thread here would wait for one that is not
+        gate.close(longEnough);
+        _exit(7);
+    }
+    int status = 0;
+    EXPECT_EQ(waitpid(child, &status, 0), child);
+    EXPECT_TRUE(WIFEXITED(status));
+    EXPECT_EQ(WEXITSTATUS(status), 7);
+    diary.note("forked");
+    inside.join();
+}
+
+/** Takes a turn, and can be cancelled after it. */
+void* takeTurn(void* diary) {
+    {
+        const gate::Turn turn;
+        pthread_testcancel();
+        static_cast<Diary*>(diary)->note("inside");
+    }
+    pthread_testcancel();
+    return nullptr;
+}
+
+TEST(TurnTest, AThreadThatIsCancelledEndsAfterItsTurn) {
+    Diary diary;
+    pthread_t thread{};
+    {
+        const gate::Turn turn;
+        ASSERT_EQ(pthread_create(&thread, nullptr, &takeTurn, &diary), 0);
+        awaitQueue(gate::theGate, 1);
+        pthread_cancel(thread);
+    }
+    void* result = nullptr;
+    ASSERT_EQ(pthread_join(thread, &result), 0);
+    EXPECT_EQ(result, PTHREAD_CANCELED);
+    EXPECT_THAT(diary.all(), ElementsAre("inside"));
+    const gate::Turn next;
+    EXPECT_EQ(gate::theGate.waiting(), 0U) << "the turn was given back";
 }
 
 }  // namespace

@@ -125,17 +125,6 @@ TEST(WrappedBrokerTest, VersionsNameAndThreadTableAreTheManagers) {
     EXPECT_EQ(wrapped.handle()->xft, &threads);
 }
 
-TEST(WrappedBrokerTest, KnowsWhenTheManagersTablesAreOthers) {
-    Manager manager{};
-    Manager other{};
-    CMPIBrokerFT services{};
-    const WrappedBroker wrapped(&manager);
-    EXPECT_TRUE(wrapped.wraps(&manager));
-    EXPECT_FALSE(wrapped.wraps(&other));
-    manager.bft = &services;
-    EXPECT_FALSE(wrapped.wraps(&manager));
-}
-
 TEST(WrappedBrokerTest, NotesAnswersThatCannotBeMade) {
     Manager manager{};
     CMPIBrokerEncFT makers{};
