@@ -83,7 +83,7 @@ std::vector<Link> linksAlong(const Way& way, const Provider& provider, const std
 }
 
 void requireInstancePath(const CMPIObjectPath* path) {
-    if (ask<&CMPIObjectPathFT::getKeyCount>(path).value == 0) {
+    if (keyCountOf(path) == 0) {
         fail(CMPI_RC_ERR_INVALID_PARAMETER, "Associations begin at an instance: the path needs its keys.");
     }
 }

@@ -7,6 +7,10 @@ std::string textOf(const CMPIString* string) {
     return characters != nullptr ? characters : "";
 }
 
+bool saysAbsent(const CMPIStatus& status) {
+    return status.rc == CMPI_RC_ERR_NOT_FOUND || status.rc == CMPI_RC_ERR_NO_SUCH_PROPERTY;
+}
+
 void require(bool couldBeDone, const char* what, const CMPIStatus& status) {
     if (couldBeDone) {
         return;

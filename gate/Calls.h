@@ -55,6 +55,9 @@ auto make(const CMPIBroker* broker, Arguments... arguments) {
     return status.rc == CMPI_RC_OK ? object : Object{};
 }
 
+/** Whether a status says that a key or property is not there, which is no failure to give it. */
+bool saysAbsent(const CMPIStatus& status);
+
 /** Fails with what the object manager could not do, unless it could. */
 void require(bool couldBeDone, const char* what, const CMPIStatus& status = {CMPI_RC_OK, nullptr});
 

@@ -12,15 +12,15 @@ namespace gate {
 
 namespace {
 
-/** How long an end of the object manager waits for requests that wait for somebody else: up-calls, slow clients. */
+/**
+ * How long an end waits for requests that wait for somebody else: up-calls, slow clients. They may wait for the very
+ * thread that ends the manager or the process.
+ */
 constexpr std::chrono::seconds patience{5};
 
-/**
- * Goes before the provider's own static objects, which were there first: from then on nobody is inside. Who is
- * elsewhere needs none of them, and may wait for the very thread that ends the process.
- */
+/** Goes before the provider's own static objects, which were there first: from then on nobody is inside. */
 const struct GateKeeper {
-    ~GateKeeper() { theGate.close(std::chrono::seconds(0), Gate::Closing::forGood); }
+    ~GateKeeper() { theGate.close(patience, Gate::Closing::forGood); }
 } gateKeeper;
 
 /** A status with its reason, as far as memory and the broker allow. */

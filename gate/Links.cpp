@@ -19,8 +19,14 @@ CMPIEnumeration* enumerateComputers(const Request& request) {
     CMPIStatus status{CMPI_RC_OK, nullptr};
     CMPIEnumeration* computers =
         broker.bft->enumerateInstances(request.broker, request.context, classPath, nullptr, &status);
-    require(status.rc == CMPI_RC_OK, "enumerate computers", status);
+    require(status.rc == CMPI_RC_OK && computers != nullptr, "enumerate computers", status);
     return computers;
+}
+
+bool hasNext(CMPIEnumeration* computers) {
+    const auto answer = ask<&CMPIEnumerationFT::hasNext>(computers);
+    require(answer.isOk(), "enumerate computers", answer.status);
+    return answer.value != 0;
 }
 
 /** The instance's path, made anew: some managers leave the namespace out. */
@@ -30,7 +36,7 @@ const CMPIObjectPath* computerPathOf(const Request& request, const CMPIInstance*
     const auto key = keyOf(given, name);
     require(key.has_value(), "name a computer");
     CMPIObjectPath* path = makePath(request.broker, nameSpaceOf(request.path), classNameOf(given).c_str());
-    const CMPICount count = ask<&CMPIObjectPathFT::getKeyCount>(given).value;
+    const CMPICount count = keyCountOf(given);
     for (CMPICount index = 0; index < count; ++index) {
         CMPIString* keyName = nullptr;
         const auto data = ask<&CMPIObjectPathFT::getKeyAt>(given, index, &keyName);
@@ -46,16 +52,21 @@ const CMPIObjectPath* computerPathOf(const Request& request, const CMPIInstance*
 std::vector<Computer> knownComputers(const Request& request) {
     std::vector<Computer> computers;
     CMPIEnumeration* enumeration = enumerateComputers(request);
-    while (ask<&CMPIEnumerationFT::hasNext>(enumeration).value != 0) {
+    while (hasNext(enumeration)) {
         const auto next = ask<&CMPIEnumerationFT::getNext>(enumeration);
         const bool isInstance = next.isOk() && next.value.type == CMPI_instance &&
                                 (next.value.state & CMPI_nullValue) == 0 && next.value.value.inst != nullptr;
         require(isInstance, "enumerate computers", next.status);
-        const CMPIObjectPath* path = computerPathOf(request, next.value.value.inst);
+        CMPIInstance* instance = next.value.value.inst;
+        const CMPIObjectPath* path = computerPathOf(request, instance);
+        if (nameSpaceOf(pathOf(instance)).empty()) {
+            // So that the instance and its name are the same; a manager that cannot do that has it as it was.
+            tell<&CMPIInstanceFT::setObjectPath>(instance, path);
+        }
         const bool isKnown = std::any_of(computers.begin(), computers.end(),
                                          [&](const Computer& each) { return samePath(each.path, path); });
         if (!isKnown) {
-            computers.push_back({path, next.value.value.inst});
+            computers.push_back({path, instance});
         }
     }
     return computers;

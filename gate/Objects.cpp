@@ -9,6 +9,8 @@ namespace {
 
 /** Whether the second path has that key of the first one. */
 bool sameKey(const CMPIData& key, const char* name, const CMPIObjectPath* other) {
+    const CMPIStatus status = ask<&CMPIObjectPathFT::getKey>(other, name).status;
+    require(status.rc == CMPI_RC_OK || saysAbsent(status), "give the keys of a path", status);
     if (key.type == CMPI_ref) {
         const CMPIObjectPath* target = referenceOf(other, name);
         return target != nullptr && samePath(key.value.ref, target);
@@ -19,18 +21,24 @@ bool sameKey(const CMPIData& key, const char* name, const CMPIObjectPath* other)
     return text && text == keyOf(other, property);
 }
 
-CMPICount keyCount(const CMPIObjectPath* path) {
-    return ask<&CMPIObjectPathFT::getKeyCount>(path).value;
-}
-
 }  // namespace
 
+CMPICount keyCountOf(const CMPIObjectPath* path) {
+    const auto answer = ask<&CMPIObjectPathFT::getKeyCount>(path);
+    require(answer.isOk(), "count the keys of a path", answer.status);
+    return answer.value;
+}
+
 std::string classNameOf(const CMPIObjectPath* path) {
-    return textOf(ask<&CMPIObjectPathFT::getClassName>(path).value);
+    const auto answer = ask<&CMPIObjectPathFT::getClassName>(path);
+    require(answer.isOk(), "give the class of a path", answer.status);
+    return textOf(answer.value);
 }
 
 std::string nameSpaceOf(const CMPIObjectPath* path) {
-    return textOf(ask<&CMPIObjectPathFT::getNameSpace>(path).value);
+    const auto answer = ask<&CMPIObjectPathFT::getNameSpace>(path);
+    require(answer.isOk(), "give the namespace of a path", answer.status);
+    return textOf(answer.value);
 }
 
 CMPIObjectPath* makePath(const CMPIBroker* broker, const std::string& nameSpace, const char* className) {
@@ -68,7 +76,8 @@ const CMPIObjectPath* pathOf(const CMPIInstance* instance) {
 }
 
 bool samePath(const CMPIObjectPath* left, const CMPIObjectPath* right) {
-    if (!sameName(classNameOf(left), classNameOf(right)) || keyCount(left) != keyCount(right)) {
+    const CMPICount count = keyCountOf(left);
+    if (count == 0 || count != keyCountOf(right) || !sameName(classNameOf(left), classNameOf(right))) {
         return false;
     }
     const std::string leftSpace = nameSpaceOf(left);
@@ -76,10 +85,11 @@ bool samePath(const CMPIObjectPath* left, const CMPIObjectPath* right) {
     if (!leftSpace.empty() && !rightSpace.empty() && !sameName(leftSpace, rightSpace)) {
         return false;
     }
-    for (CMPICount index = 0; index < keyCount(left); ++index) {
+    for (CMPICount index = 0; index < count; ++index) {
         CMPIString* name = nullptr;
         const auto key = ask<&CMPIObjectPathFT::getKeyAt>(left, index, &name);
-        if (!key.isOk() || !sameKey(key.value, textOf(name).c_str(), right)) {
+        require(key.isOk(), "give the keys of a path", key.status);
+        if (!sameKey(key.value, textOf(name).c_str(), right)) {
             return false;
         }
     }

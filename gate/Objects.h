@@ -12,6 +12,7 @@ namespace gate {
 
 std::string classNameOf(const CMPIObjectPath* path);
 std::string nameSpaceOf(const CMPIObjectPath* path);
+CMPICount keyCountOf(const CMPIObjectPath* path);
 
 /** A path of a class without keys. Fails when it cannot be made, as the others here do. */
 CMPIObjectPath* makePath(const CMPIBroker* broker, const std::string& nameSpace, const char* className);
@@ -28,7 +29,7 @@ OwnPath namingPath(const CMPIObjectPath* path, const Class& named);
 /** The path of an instance. */
 const CMPIObjectPath* pathOf(const CMPIInstance* instance);
 
-/** Whether two paths name the same instance; of host and namespace only what both say counts. */
+/** Whether two paths name the same instance, which takes keys; of host and namespace only what both say counts. */
 bool samePath(const CMPIObjectPath* left, const CMPIObjectPath* right);
 
 }  // namespace gate

@@ -57,10 +57,16 @@ const CMPIInstance* PropertyList::applied(const CMPIBroker* broker, const CMPIIn
     }
     CMPIInstance* made = makeInstance(broker, pathOf(instance));
     // Some managers put all properties of a class into a new instance: this keeps out what nobody asked for.
+    // The keys are listed besides: there are managers that do not show what is only named as a key.
     std::vector<const char*> keys = keysOf(owner);
-    tell<&CMPIInstanceFT::setPropertyFilter>(made, names, keys.data());
+    std::vector<const char*> shown = keys;
+    for (const char** name = names; *name != nullptr; ++name) {
+        shown.insert(shown.end() - 1, *name);
+    }
+    tell<&CMPIInstanceFT::setPropertyFilter>(made, shown.data(), keys.data());
     for (const Property& property : owner) {
         const auto answer = ask<&CMPIInstanceFT::getProperty>(instance, property.name);
+        require(answer.isOk() || saysAbsent(answer.status), "give the value of a property", answer.status);
         const bool isThere = answer.isOk() && (answer.value.state & (CMPI_notFound | CMPI_badValue)) == 0;
         if (isThere && (property.isKey || has(property))) {
             const bool isNull = (answer.value.state & CMPI_nullValue) != 0;

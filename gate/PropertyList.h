@@ -11,6 +11,9 @@ class PropertyList {
 public:
     explicit PropertyList(const char** listed) : names(listed) {}
 
+    /** Whether there is a list, so that what is on it was chosen. */
+    bool isGiven() const { return names != nullptr; }
+
     bool has(const Property& property) const;
 
     /** Whether every property of the class is on it. */

@@ -120,7 +120,7 @@ CMPIValue reference(const CMPIObjectPath* target) {
 }  // namespace
 
 std::optional<std::string> valueOf(const CMPIData& data, const CMPIStatus& status, const Property& property) {
-    if (status.rc == CMPI_RC_ERR_NO_SUCH_PROPERTY || status.rc == CMPI_RC_ERR_NOT_FOUND) {
+    if (saysAbsent(status)) {
         return std::nullopt;
     }
     require(status.rc == CMPI_RC_OK, (std::string("give the value of ") + property.name).c_str(), status);

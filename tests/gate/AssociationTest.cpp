@@ -188,6 +188,18 @@ TEST_F(AssociationTest, OneComputerIsEnough) {
     EXPECT_THAT(gate().enumerateInstances(classPath(leaseSetting)), isAnswered(1));
 }
 
+TEST_F(AssociationTest, AComputerAndItsNameAreTheSameWhereTheManagerLeavesTheNamespaceOut) {
+    const ObjectPath bare = testsupport::objectPath("", "VELKO_ComputerSystem", {named("Name", text("alpha"))});
+    broker.serve("VELKO_ComputerSystem", {testsupport::instance(bare, {named("Name", text("alpha"))})});
+    const Outcome computers = gate().associators(keyedPath(lease, firstPlace), {});
+    ASSERT_THAT(computers, isAnswered(1));
+    EXPECT_EQ(testsupport::toText(computers.instances().front().path), alpha);
+    const Outcome listed = gate().associators(keyedPath(lease, firstPlace), {}, {{"Name"}});
+    ASSERT_THAT(listed, isAnswered(1));
+    EXPECT_EQ(testsupport::toText(listed.instances().front().path), alpha);
+    EXPECT_THAT(names(keyedPath(lease, firstPlace)), ElementsAre(alpha));
+}
+
 TEST_F(AssociationTest, AComputerThatIsEnumeratedTwiceCountsOnce) {
     const Instance twice = testsupport::instance(computerPath("alpha"));
     broker.serve("VELKO_ComputerSystem", {twice, twice});

@@ -2,9 +2,12 @@
 
 #include "support/Files.h"
 
+#include <unistd.h>
+
 #include <algorithm>
 #include <condition_variable>
 #include <cstdlib>
+#include <fstream>
 #include <map>
 #include <mutex>
 #include <set>
@@ -224,6 +227,13 @@ TEST_P(LoadTest, ClientsTablesAndFilesAgreeAfterAMixedLoad) {
 INSTANTIATE_TEST_SUITE_P(Gate, LoadTest, testing::Values(Manager::standard, Manager::sfcb, Manager::openPegasus),
                          [](const auto& parameter) { return std::string(cimhost::profileOf(parameter.param).name); });
 
+/** Whether a thread of this process sleeps, or has ended: it has come as far as it can. */
+bool isAsleep(pid_t thread) {
+    std::ifstream file("/proc/self/task/" + std::to_string(thread) + "/stat");
+    std::string stat;
+    return !std::getline(file, stat) || stat.compare(stat.rfind(')') + 1, 2, " S") == 0;
+}
+
 /** Counts the threads that are in the broker's newInstance, that is, inside the provider. */
 class InsideCounter {
 public:
@@ -242,6 +252,7 @@ public:
     void comes() {
         const std::lock_guard<std::mutex> lock(mutex);
         ++coming;
+        threads.push_back(gettid());
         changed.notify_all();
     }
 
@@ -261,6 +272,7 @@ public:
     int awaitedInside = 0;
     int awaitedComing = 0;
     int most = 0;
+    bool awaitsSleep = false;  ///< inside, wait also until all others have come as far as they can
 
 private:
     static CMPIInstance* newInstance(const CMPIBroker* itsBroker, const CMPIObjectPath* path, CMPIStatus* rc) {
@@ -270,6 +282,15 @@ private:
         self.most = std::max(self.most, self.inside);
         self.changed.notify_all();
         self.changed.wait(lock, [&] { return self.most >= self.awaitedInside && self.coming >= self.awaitedComing; });
+        const std::vector<pid_t> others = self.awaitsSleep ? self.threads : std::vector<pid_t>{};
+        self.awaitsSleep = false;
+        lock.unlock();
+        for (const pid_t thread : others) {
+            while (thread != gettid() && !isAsleep(thread)) {
+                std::this_thread::yield();
+            }
+        }
+        lock.lock();
         --self.inside;
         lock.unlock();
         return original(itsBroker, path, rc);
@@ -282,6 +303,7 @@ private:
     std::condition_variable changed;
     int inside = 0;
     int coming = 0;
+    std::vector<pid_t> threads;
     CMPIBrokerEncFT makers;
     CMPIBroker broker;
 };
@@ -301,6 +323,7 @@ protected:
         InsideCounter counter(*broker.handle());
         counter.awaitedInside = insideAtOnce;
         counter.awaitedComing = clientCount;
+        counter.awaitsSleep = insideAtOnce == 1;
         testsupport::ProviderLibrary library(file, name, broker);
         ASSERT_NE(library.createInstanceMI(counter.handle(), nullptr), nullptr);
         std::vector<Outcome> outcomes(clientCount);
