@@ -1,8 +1,10 @@
 #include "Changes.h"
 
 #include "Calls.h"
+#include "LossyValues.h"
 
 #include <algorithm>
+#include <string_view>
 
 namespace gate {
 
@@ -11,13 +13,59 @@ namespace {
 /** Goes on by itself: what a client sends back is always of yesterday. */
 constexpr const char* movingProperty = "LocalDateTime";
 
-/** How the provider knows that there is no date. */
-constexpr const char* noDate = "00000000000000.000000-000";
+/** Properties of which the provider takes one that it is not given from the one before it. */
+constexpr std::string_view chainedProperties = "Personalized";
+
+/** How the provider shows an empty one of them. */
+constexpr const char* shownForEmpty = "Null";
+
+bool isChained(const Property& property) {
+    return sameName(std::string_view(property.name).substr(0, chainedProperties.size()), chainedProperties);
+}
+
+/** What is stored where the provider shows a text. */
+std::string stored(const Property& property, const std::string& shown) {
+    return isChained(property) && shown == shownForEmpty ? std::string() : shown;
+}
+
+/** A datetime in one of the ways to write it: no date and no offset have two. */
+std::string uniform(const std::string& dateTime) {
+    constexpr std::string_view noOffset = "+000";
+    const std::size_t offset = std::string_view(noDate).size() - noOffset.size();
+    const bool isOther = dateTime.size() == offset + noOffset.size() && dateTime.compare(offset, 4, noOffset) == 0;
+    return isOther ? dateTime.substr(0, offset) + "-000" : dateTime;
+}
+
+/** A text without what object managers take off its ends: all of them blanks, some also what is outside of ASCII. */
+std::string_view trimmed(std::string_view text, bool alsoOutsideAscii) {
+    const auto stays = [&](unsigned char each) { return each > ' ' && !(alsoOutsideAscii && each > 0x7F); };
+    const auto* begin = std::find_if(text.begin(), text.end(), stays);
+    const auto end = std::find_if(text.rbegin(), std::string_view::reverse_iterator(begin), stays).base();
+    return text.substr(static_cast<std::size_t>(begin - text.begin()), static_cast<std::size_t>(end - begin));
+}
+
+/**
+ * Whether a given value is the current one, such as a client has read it and an object manager has passed it on.
+ * One that can be changed, and that the client has listed, may really be the current one without its last letter.
+ */
+bool isAsItWas(const Property& property, const CMPIInstance* current, const std::string& given, bool isListed) {
+    const auto text = propertyOf(current, property);
+    if (property.type == CMPI_dateTime) {
+        return uniform(text.value_or(noDate)) == uniform(given);
+    }
+    if (!text || stored(property, *text) == stored(property, given)) {
+        return text.has_value();
+    }
+    const bool mayLackLetters = !property.isWritable || !isListed;
+    return property.type == CMPI_string &&
+           (trimmed(*text, false) == given || (mayLackLetters && trimmed(*text, true) == given));
+}
 
 /** Refuses names that the class does not have. */
 void requireKnownProperties(const Class& owner, const CMPIInstance* instance) {
-    const CMPICount count = ask<&CMPIInstanceFT::getPropertyCount>(instance).value;
-    for (CMPICount index = 0; index < count; ++index) {
+    const auto count = ask<&CMPIInstanceFT::getPropertyCount>(instance);
+    require(count.isOk(), "count the properties of the instance", count.status);
+    for (CMPICount index = 0; index < count.value; ++index) {
         CMPIString* nameString = nullptr;
         ask<&CMPIInstanceFT::getPropertyAt>(instance, index, &nameString);
         const std::string name = textOf(nameString);
@@ -44,17 +92,18 @@ Values givenValues(const Class& owner, const CMPIInstance* instance, const Prope
     return values;
 }
 
-Values changesTo(const CMPIInstance* current, const Values& given) {
+Values changesTo(const CMPIInstance* current, const Values& given, bool areListed) {
     Values changes;
     for (const auto& [property, text] : given) {
-        if (propertyOf(current, *property) == text || sameName(property->name, movingProperty)) {
+        if (sameName(property->name, movingProperty) || isAsItWas(*property, current, text, areListed)) {
             continue;
         }
         if (!property->isWritable) {
             fail(CMPI_RC_ERR_INVALID_PARAMETER,
                  std::string(property->name) + " cannot be changed. Leave it out, or send it back as it is.");
         }
-        changes.emplace_back(property, text);
+        const bool isNoDate = property->type == CMPI_dateTime && uniform(text) == noDate;
+        changes.emplace_back(property, isNoDate ? noDate : text);
     }
     return changes;
 }
@@ -63,16 +112,15 @@ Values changed(const Class& owner, const CMPIInstance* current, const Values& ch
     Values values = changes;
     for (const Property& property : owner) {
         const auto isIt = [&](const auto& change) { return change.first == &property; };
-        if (!property.isWritable || std::any_of(changes.begin(), changes.end(), isIt)) {
+        if (!isChained(property) || std::any_of(changes.begin(), changes.end(), isIt)) {
             continue;
         }
         const auto text = propertyOf(current, property);
-        if (text) {
-            values.emplace_back(&property, *text);
-        } else if (property.type != CMPI_dateTime) {
-            // Everything but a date has a value: without it, the provider cannot have read its file.
+        if (!text) {
+            // Each of them has a value: without it, the provider cannot have read its file.
             fail(CMPI_RC_ERR_FAILED, std::string(property.name) + " cannot be read, so nothing is changed.");
         }
+        values.emplace_back(&property, stored(property, *text));
     }
     return values;
 }
@@ -80,17 +128,22 @@ Values changed(const Class& owner, const CMPIInstance* current, const Values& ch
 Values undoing(const Values& changes, const CMPIInstance* current) {
     Values values;
     for (const auto& change : changes) {
-        values.emplace_back(change.first, propertyOf(current, *change.first).value_or(noDate));
+        const Property& property = *change.first;
+        values.emplace_back(&property, stored(property, propertyOf(current, property).value_or(noDate)));
     }
     return values;
 }
 
-void requireChanged(const CMPIInstance* before, const CMPIInstance* after, const Values& changes) {
+void requireChanged(const DataFile& file, const CMPIInstance* before, const CMPIInstance* after,
+                    const Values& changes) {
     for (const auto& [property, text] : changes) {
         const auto now = propertyOf(after, *property);
+        const bool isDate = property->type == CMPI_dateTime;
+        const bool isThere = now && (isDate ? uniform(*now) == uniform(text) : *now == text);
+        const bool isNull = !now && isDate && !isShown(file, text);
         // An empty text may be shown by a word for it: that it is not the old one must do.
-        const bool isChanged = text.empty() ? now != propertyOf(before, *property) : now == text;
-        if (!isChanged) {
+        const bool isEmptied = text.empty() && now != propertyOf(before, *property);
+        if (!isThere && !isNull && !isEmptied) {
             fail(CMPI_RC_ERR_FAILED,
                  std::string(property->name) + " could not be stored. The agent's log, level 3000, may say why.");
         }

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "DataFile.h"
 #include "PropertyList.h"
 #include "Values.h"
 
@@ -13,13 +14,15 @@ Values givenValues(const Class& owner, const CMPIInstance* instance, const Prope
 
 /**
  * Those of the given values that are not what the current instance has. CMPI_RC_ERR_INVALID_PARAMETER, with the
- * property's name, when one of them cannot be changed.
+ * property's name, when one of them cannot be changed. Values come back as they were also when the object manager has
+ * taken off what stood at their ends.
+ * @param areListed whether the client has chosen the properties, rather than sent back all that it has read
  */
-Values changesTo(const CMPIInstance* current, const Values& given);
+Values changesTo(const CMPIInstance* current, const Values& given, bool areListed);
 
 /**
- * What the provider is given to make changes: every writable value that the current instance has, and the changes over
- * them. A provider that is told only a part of them may take the rest from somewhere else.
+ * What the provider is given to make changes: the changes, and of the current instance those values that it would take
+ * from somewhere else if they were not sent.
  */
 Values changed(const Class& owner, const CMPIInstance* current, const Values& changes);
 
@@ -27,6 +30,6 @@ Values changed(const Class& owner, const CMPIInstance* current, const Values& ch
 Values undoing(const Values& changes, const CMPIInstance* current);
 
 /** Fails unless the instance, read again after a change, has the changes. */
-void requireChanged(const CMPIInstance* before, const CMPIInstance* after, const Values& changes);
+void requireChanged(const DataFile& file, const CMPIInstance* before, const CMPIInstance* after, const Values& changes);
 
 }  // namespace gate

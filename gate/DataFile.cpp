@@ -5,6 +5,7 @@
 
 #include <fcntl.h>
 #include <sys/stat.h>
+#include <sys/statvfs.h>
 #include <unistd.h>
 
 #include <algorithm>
@@ -59,6 +60,18 @@ private:
     int number;
 };
 
+/** Whether a file system has room for a file's growth, and for the part of a block that it leaves empty. */
+bool hasRoom(const std::string& directory, std::size_t growth) {
+    constexpr std::size_t block = 4096;
+    struct statvfs system {};
+    const bool isKnown = statvfs(directory.c_str(), &system) == 0 && system.f_blocks != 0 && system.f_frsize != 0;
+    if (growth == 0 || !isKnown) {
+        return true;  // what cannot be known is seen afterwards
+    }
+    const auto blocks = geteuid() == 0 ? system.f_bfree : system.f_bavail;  // the last ones are kept for root
+    return blocks > (growth + block) / system.f_frsize;
+}
+
 /** The lines of a text each of which is ended; the rest, if there is one, makes a line that is empty. */
 std::vector<std::string> linesOf(const std::string& text) {
     std::vector<std::string> lines;
@@ -82,7 +95,7 @@ std::size_t declaredIn(const std::vector<std::string>& lines) {
 
 }  // namespace
 
-void DataFile::requireWritable() const {
+void DataFile::requireWritable(std::size_t growth) const {
     const std::string path = pathOf(*this);
     const std::string directory = KO::PlatformUtilities::getKelsaDataDir();
     const Descriptor descriptor(path);
@@ -96,6 +109,9 @@ void DataFile::requireWritable() const {
     const bool needsDirectory = !descriptor.isOpen() || !keepsRecords();
     if (needsDirectory && access(directory.c_str(), W_OK | X_OK) != 0) {
         failFor(path, "the data directory " + directory + ": " + reasonOf(errno));
+    }
+    if (!hasRoom(directory, growth)) {
+        failFor(path, reasonOf(ENOSPC));
     }
 }
 
@@ -122,11 +138,11 @@ std::size_t DataFile::recordsOf(const std::string& identifier) const {
     return found;
 }
 
-std::size_t DataFile::recordsBefore(const std::string& identifier) const {
+std::optional<std::size_t> DataFile::recordsIfWhole(const std::string& identifier) const {
     try {
         return recordsOf(identifier);
     } catch (const Failure&) {
-        return 0;
+        return std::nullopt;
     }
 }
 

@@ -3,6 +3,7 @@
 #include "Schema.h"
 
 #include <cstddef>
+#include <optional>
 #include <string>
 
 namespace gate {
@@ -19,8 +20,12 @@ struct DataFile {
     /** Whether instances can be created and deleted. */
     bool keepsRecords() const { return linesPerRecord != 0; }
 
-    /** CMPI_RC_ERR_FAILED with the reason, when the file could not be written now. */
-    void requireWritable() const;
+    /**
+     * CMPI_RC_ERR_FAILED with the reason, when the file could not be written now: the provider empties a file of
+     * records before it sees that there is no room for it.
+     * @param growth how many bytes the file will need in addition, at most
+     */
+    void requireWritable(std::size_t growth) const;
 
     /**
      * How many records the file has with that identifier, 0 for a property file. CMPI_RC_ERR_FAILED when the file is
@@ -28,8 +33,8 @@ struct DataFile {
      */
     std::size_t recordsOf(const std::string& identifier) const;
 
-    /** recordsOf(), but 0 also for a file that is not there or not whole: what there is before a change. */
-    std::size_t recordsBefore(const std::string& identifier) const;
+    /** recordsOf(), but none for a file that is not whole. */
+    std::optional<std::size_t> recordsIfWhole(const std::string& identifier) const;
 };
 
 /** The file of a class; null for a class whose instances are not kept in one and cannot be changed. */

@@ -7,6 +7,9 @@
 #include "Objects.h"
 #include "Provider.h"
 
+#include <algorithm>
+#include <iterator>
+
 namespace gate {
 
 namespace {
@@ -50,20 +53,55 @@ struct Target {
             fail(CMPI_RC_ERR_FAILED, std::string(file.fileName) + " does not hold " + identifier() + ".");
         }
     }
+
+    /** @param before how many records with the identifier there were before this one was deleted */
+    void requireDeleted(std::size_t before) const {
+        const std::size_t after = file.recordsOf(identifier());
+        if (after != 0 && after >= before) {
+            fail(CMPI_RC_ERR_FAILED, std::string(file.fileName) + " still holds " + identifier() + ".");
+        }
+    }
 };
+
+/** How many bytes values take in a file, at most. */
+std::size_t sizeOf(const Values& values) {
+    std::size_t size = 0;
+    for (const auto& value : values) {
+        size += value.second.size() + 1;
+    }
+    return size;
+}
+
+/**
+ * Runs a change and its checks. When one fails, the change is undone, and the failure goes on: with a word where the
+ * file could not be brought back either.
+ */
+template <class Change, class Undo>
+void orUndone(const Target& target, Change change, Undo undo) {
+    try {
+        change();
+    } catch (Failure& failure) {
+        undo();
+        if (!target.file.recordsIfWhole({})) {
+            failure.text += std::string(" ") + target.file.fileName + " stays damaged until the next change succeeds.";
+        }
+        throw;
+    } catch (...) {
+        undo();
+        throw;
+    }
+}
 
 /** Makes the changes; when they cannot be stored, the provider is given the old values back. */
 void apply(const Provider& provider, const Target& target, const CMPIInstance* current, const Values& changes) {
     const OwnInstance wanted(changed(target.owner, current, changes));
     const OwnInstance undone(changed(target.owner, current, undoing(changes, current)));
-    try {
+    const auto change = [&] {
         provider.modify(target.path, wanted);
-        requireChanged(current, existing(provider, target.path, target.owner), changes);
+        requireChanged(target.file, current, existing(provider, target.path, target.owner), changes);
         target.requireStored();
-    } catch (...) {
-        provider.modify(target.path, undone);
-        throw;
-    }
+    };
+    orUndone(target, change, [&] { provider.modify(target.path, undone); });
 }
 
 /** The identifier of a new record: from the path or, where that has none, from the instance. */
@@ -75,16 +113,34 @@ std::string identifierFor(const CMPIObjectPath* path, const CMPIInstance* instan
         fail(CMPI_RC_ERR_INVALID_PARAMETER, std::string("A new ") + owner.name + " needs a value of its key " +
                                                 key.name + ", in the path or in the instance.");
     }
-    if (!named.empty() && !given.empty() && named != given) {
-        fail(CMPI_RC_ERR_INVALID_PARAMETER,
-             std::string(key.name) + " is \"" + named + "\" in the path and \"" + given + "\" in the instance.");
-    }
     return named.empty() ? given : named;
+}
+
+/** The values for a new record; its identifier is none of them. */
+Values valuesFor(const Class& owner, const CMPIInstance* instance) {
+    Values values = givenValues(owner, instance, PropertyList(nullptr));
+    values.erase(std::remove_if(values.begin(), values.end(), [](const auto& value) { return value.first->isKey; }),
+                 values.end());
+    return values;
+}
+
+/** Refuses read-only values before there is a record that has others: all records have the same. */
+void requireReadOnly(const Provider& provider, const Target& target, const Values& given) {
+    Values readOnly;
+    std::copy_if(given.begin(), given.end(), std::back_inserter(readOnly),
+                 [](const auto& value) { return !value.first->isWritable; });
+    if (readOnly.empty()) {
+        return;
+    }
+    const Provider::Paths paths = provider.names(OwnPath(nameSpaceOf(target.path.handle()), target.owner.name));
+    if (!paths.empty()) {
+        changesTo(existing(provider, namingPath(paths.front(), target.owner), target.owner), readOnly, false);
+    }
 }
 
 void fillNew(const Provider& provider, const Target& target, const Values& given) {
     const CMPIInstance* current = existing(provider, target.path, target.owner);
-    const Values changes = changesTo(current, given);
+    const Values changes = changesTo(current, given, false);
     target.requireStored();
     if (!changes.empty()) {
         apply(provider, target, current, changes);
@@ -97,18 +153,18 @@ void create(const Request& request, const Provider& provider, const Target& targ
         fail(CMPI_RC_ERR_ALREADY_EXISTS,
              std::string("There is a ") + target.owner.name + " " + target.identifier() + " already.");
     }
-    target.file.requireWritable();
+    requireReadOnly(provider, target, given);
+    target.file.requireWritable(target.identifier().size() + 1 + sizeOf(given));
     CMPIObjectPath* answer = makePath(request.broker, nameSpaceOf(request.path), target.owner.name);
     addKey(answer, identifierKey, target.identifier());
-    try {
+    const auto change = [&] {
         provider.create(target.path);
         fillNew(provider, target, given);
+        const Pause pause;
         request.give(answer);
         request.finish();
-    } catch (...) {
-        provider.remove(target.path);
-        throw;
-    }
+    };
+    orUndone(target, change, [&] { provider.remove(target.path); });
 }
 
 }  // namespace
@@ -156,7 +212,7 @@ void createInstance(const Request& request, const CMPIInstance* instance) {
     const DataFile& file = fileOf(requested, true);
     requireInstance(instance);
     const std::string identifier = identifierFor(request.path, instance, requested);
-    const Values given = givenValues(requested, instance, PropertyList(nullptr));
+    const Values given = valuesFor(requested, instance);
     requireKept(file, *findProperty(requested, identifierKey), identifier);
     requireKept(file, given);
     OwnPath path(nameSpaceOf(request.path), requested.name);
@@ -174,10 +230,10 @@ void modifyInstance(const Request& request, const CMPIInstance* instance, const 
     const Values given = givenValues(requested, instance, list);
     const Provider provider(request);
     const CMPIInstance* current = existing(provider, target.path, requested);
-    const Values changes = changesTo(current, given);
+    const Values changes = changesTo(current, given, list.isGiven());
     requireKept(file, changes);
     if (!changes.empty()) {
-        file.requireWritable();
+        file.requireWritable(sizeOf(changes));
         apply(provider, target, current, changes);
     }
 }
@@ -187,15 +243,20 @@ void deleteInstance(const Request& request) {
     const DataFile& file = fileOf(requested, true);
     const Target target{requested, file, namingPath(request.path, requested)};
     const Provider provider(request);
-    existing(provider, target.path, requested);
-    file.requireWritable();
-    const std::size_t before = file.recordsBefore(target.identifier());
-    provider.remove(target.path);
-    const std::size_t after = file.recordsOf(target.identifier());
-    if (after != 0 && after >= before) {
-        fail(CMPI_RC_ERR_FAILED, std::string(requested.name) + " " + target.identifier() +
-                                     " is deleted for now only: " + file.fileName + " still holds it.");
-    }
+    const CMPIInstance* current = existing(provider, target.path, requested);
+    const OwnInstance restored(givenValues(requested, current, PropertyList(nullptr)));
+    file.requireWritable(0);
+    const std::size_t before = file.recordsIfWhole(target.identifier()).value_or(0);
+    const auto change = [&] {
+        provider.remove(target.path);
+        target.requireDeleted(before);
+    };
+    orUndone(target, change, [&] {
+        if (provider.get(target.path) == nullptr) {
+            provider.create(target.path);
+            provider.modify(target.path, restored);
+        }
+    });
 }
 
 }  // namespace gate

@@ -55,14 +55,12 @@ bool isInterval(std::string_view text) {
 
 /** The framework makes a date of a text and a text of the date: a valid one comes back. */
 bool isPointInTime(const std::string& text) {
-    constexpr std::string_view noDate = "00000000000000.000000-000";
     return text != noDate && KO::Utils::convertCIMDateTime(KO::Utils::convertStringToDateTime(text)) == text;
 }
 
 const char* lossOf(const DataFile& file, const Property& property, const std::string& text) {
     if (property.type == CMPI_dateTime) {
-        const bool isKept = isPointInTime(text) || (file.keepsRecords() && isInterval(text));
-        return isKept ? nullptr : "it is not a valid datetime";
+        return text == noDate || isShown(file, text) ? nullptr : "it is not a valid datetime";
     }
     if (property.type != CMPI_string || !file.keepsRecords()) {
         return nullptr;
@@ -76,6 +74,10 @@ const char* lossOf(const DataFile& file, const Property& property, const std::st
 }
 
 }  // namespace
+
+bool isShown(const DataFile& file, const std::string& dateTime) {
+    return isPointInTime(dateTime) || (file.keepsRecords() && isInterval(dateTime));
+}
 
 void requireKept(const DataFile& file, const Property& property, const std::string& text) {
     const char* loss = lossOf(file, property, text);

@@ -15,4 +15,7 @@ void requireKept(const DataFile& file, const Property& property, const std::stri
 /** The same for every one of the values that can be written. */
 void requireKept(const DataFile& file, const Values& values);
 
+/** Whether the provider shows a datetime that it was given: it shows null for what is none. */
+bool isShown(const DataFile& file, const std::string& dateTime);
+
 }  // namespace gate

@@ -99,7 +99,9 @@ const CMPIBroker* Provider::manager() {
 
 Provider::Provider(const Request& request) : context(request.context) {
     request.broker = manager();
-    require(request.broker != nullptr, "connect to the provider behind the gate");
+    if (request.broker == nullptr) {
+        fail(CMPI_RC_ERR_FAILED, closedText);
+    }
 }
 
 void Provider::end(const CMPIContext* context) {

@@ -17,6 +17,9 @@ namespace gate {
 /** Values of properties, each named once. */
 using Values = std::vector<std::pair<const Property*, std::string>>;
 
+/** How the provider writes that there is no date. */
+constexpr const char* noDate = "00000000000000.000000-000";
+
 /**
  * The value that an object manager gave for a property; none when there is none or it is null. The state comes first,
  * then the pointer, then the characters: brokers give null values pointers to strings without characters.

@@ -86,4 +86,8 @@ bool isDateTime(std::string_view text) {
            isTimeOfDay(text.substr(8));
 }
 
+bool isNoDateTime(std::string_view text) {
+    return text == "00000000000000.000000-000" || text == "00000000000000.000000+000";
+}
+
 }  // namespace cimhost

@@ -28,4 +28,7 @@ bool singleCharacter(std::string_view text, std::uint16_t& code);
 /** Whether the text is a CIM datetime: a date that exists, or an interval; fields may be asterisks from the right. */
 bool isDateTime(std::string_view text);
 
+/** Whether the text is a time of nothing but zeros: no datetime, but sent to say that there is none. */
+bool isNoDateTime(std::string_view text);
+
 }  // namespace cimhost

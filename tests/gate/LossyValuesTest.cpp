@@ -70,7 +70,7 @@ TEST_F(LossyValuesTest, AreRefusedAsIdentifiersToo) {
 TEST_F(LossyValuesTest, DatesThatAreNoneAreRefused) {
     create("L1");
     for (const char* date : {"20261301000000.000000+000", "20260230000000.000000+000", "20260101240000.000000+000",
-                             "2026010100****.******+000", "00000000000000.000000-000", "yesterday", ""}) {
+                             "2026010100****.******+000", "00000000000000.000000+060", "yesterday", ""}) {
         EXPECT_THAT(modify("L1", {named("BaseTermCommencementDate", text(date))}),
                     isRefused(CMPI_RC_ERR_INVALID_PARAMETER, "BaseTermCommencementDate"))
             << date;
@@ -109,9 +109,30 @@ TEST_F(LossyValuesTest, AreTakenWhereTheOperatorWantsThat) {
         EXPECT_THAT(create(id, {named("Lessor", text(value))}), isAnswered(1)) << value;
         EXPECT_EQ(valueIn(got(id), "Lessor"), value);
     }
+    EXPECT_THAT(create("two\nlines"), isRefused(CMPI_RC_ERR_FAILED, "does not hold")) << "the record cannot be found";
     EXPECT_THAT(create("L1", {named("Lessor", text("two\nlines"))}), isAnswered(1));
     EXPECT_THAT(modify("L1", {named("LeaseTerm", uint32(3))}), isDone()) << "with lines that are too many";
     EXPECT_THAT(remove("L1"), isDone());
+    unload();  // before the configuration is as it was
+}
+
+TEST_F(LossyValuesTest, DatesThatAreNoneAreTakenAsNoneWhereTheOperatorWantsThat) {
+    const RefusalOff off;
+    const std::vector<std::string> none{"20261301000000.000000+000", "20260230000000.000000+000", "yesterday", ""};
+    for (const std::string& date : none) {
+        create("L1", {named("BaseTermCommencementDate", dateTime("20260101000000.000000+060"))});
+        EXPECT_THAT(modify("L1", {named("BaseTermCommencementDate", text(date))}), isDone()) << date;
+        EXPECT_EQ(valueIn(got("L1"), "BaseTermCommencementDate"), std::nullopt) << date;
+        EXPECT_THAT(remove("L1"), isDone());
+        EXPECT_THAT(create("L1", {named("BaseTermCommencementDate", text(date))}), isAnswered(1)) << date;
+        EXPECT_THAT(remove("L1"), isDone());
+    }
+    const ObjectPath path = gate().enumerateInstanceNames(classPath(asset)).paths().front();
+    for (const char* date : {"20240229000000.000000+000", "00000001000000.000000:000"}) {
+        EXPECT_THAT(gate().modifyInstance(path, testsupport::instance(path, {named("PurchaseDate", dateTime(date))})),
+                    isDone());
+    }
+    EXPECT_EQ(valueIn(only(asset), "PurchaseDate"), std::nullopt) << "an interval is no date there";
     unload();  // before the configuration is as it was
 }
 

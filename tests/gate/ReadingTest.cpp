@@ -1,5 +1,7 @@
 #include "GateFixture.h"
 
+#include "support/Files.h"
+
 // Reading, and the one class besides leases and warranties that can be changed.
 
 namespace gatetest {
@@ -30,6 +32,15 @@ TEST_F(ReadingTest, PropertyListsAreAppliedAndKeysStay) {
     const Outcome keys = gate().enumerateInstances(classPath(lease), cimhost::PropertyList(std::vector<std::string>{}));
     ASSERT_THAT(keys, isAnswered(1));
     EXPECT_THAT(namesOf(keys.instances().front().properties), ElementsAre("InstanceID"));
+}
+
+TEST_F(ReadingTest, ManagersThatHideWhatIsOnlyNamedAsAKeyShowTheKeys) {
+    create("L1");
+    broker.forget();
+    gate().getInstance(keyedPath(lease, "L1"), {{"Lessor"}});
+    const auto filters = broker.calls("CMPIInstanceFT.setPropertyFilter");
+    ASSERT_FALSE(filters.empty());
+    EXPECT_THAT(filters.back().arguments, ElementsAre("{InstanceID,Lessor}", "{InstanceID}"));
 }
 
 TEST_F(ReadingTest, AListOfEveryPropertyIsAsGoodAsNone) {
@@ -110,6 +121,49 @@ TEST_F(AssetTest, AnInstanceThatComesBackAsItWasReadIsAccepted) {
     EXPECT_THAT(gate().modifyInstance(path(), sent), isDone());
     EXPECT_EQ(valueIn(current(), "ZOPMProfile"), "Factory");
     EXPECT_EQ(valueIn(current(), "DeploymentProfile"), "Factory");
+}
+
+TEST_F(AssetTest, APathWithoutItsKeysChangesNothing) {
+    ObjectPath keyless = path();
+    const Instance sent = testsupport::instance(keyless, {named("AssetNumber", text("A1"))});
+    while (!keyless.keys.empty()) {
+        keyless.keys.pop_back();
+        EXPECT_THAT(gate().modifyInstance(keyless, sent), isRefused(CMPI_RC_ERR_INVALID_PARAMETER, "key"));
+    }
+    EXPECT_EQ(valueIn(current(), "AssetNumber"), "");
+}
+
+TEST_F(AssetTest, AChangeWritesNoPersonalizedTextThatNobodyGave) {
+    EXPECT_THAT(change({named("AssetNumber", text("A1"))}), isDone());
+    const std::string untouched = testsupport::readFile(dataFile("asset.dat"));
+    EXPECT_THAT(untouched, testing::HasSubstr("USER.AssetNumber=A1\n"));
+    EXPECT_THAT(untouched, Not(testing::HasSubstr("Null")));
+    EXPECT_THAT(change({named("PersonalizedLabel2", text("Room")), named("PersonalizedData4", text(""))}), isDone());
+    EXPECT_THAT(testsupport::readFile(dataFile("asset.dat")), Not(testing::HasSubstr("Null")));
+    EXPECT_THAT(gate().modifyInstance(path(), current()), isDone()) << "as it was read";
+    EXPECT_THAT(testsupport::readFile(dataFile("asset.dat")), Not(testing::HasSubstr("Null")));
+    EXPECT_EQ(valueIn(current(), "PersonalizedLabel2"), "Room");
+    EXPECT_EQ(valueIn(current(), "PersonalizedLabel3"), "Null");
+}
+
+TEST_F(AssetTest, AReadOnlyTextThatAManagerTrimsIsAsItWas) {
+    testsupport::writeFile(dataFile("asset.dat"), "USER.AssetIdTag=TAG-7 \xc3\xa9\nUSER.AssetNumber=A1 \n");
+    const Instance before = current();
+    for (const char* tag : {"TAG-7", "TAG-7 \xc3\xa9"}) {
+        EXPECT_THAT(change({named("AssetIdTag", text(tag)), named("AssetNumber", text("A1")),
+                            named("PrimaryOwnerName", text("Jo"))}),
+                    isDone());
+    }
+    EXPECT_EQ(valueIn(current(), "AssetIdTag"), valueIn(before, "AssetIdTag"));
+    EXPECT_EQ(valueIn(current(), "AssetNumber"), valueIn(before, "AssetNumber"));
+    EXPECT_THAT(change({named("AssetIdTag", text("TAG"))}), isRefused(CMPI_RC_ERR_INVALID_PARAMETER, "AssetIdTag"));
+}
+
+TEST_F(AssetTest, ADateIsTakenAwayByZeros) {
+    EXPECT_THAT(change({named("PurchaseDate", dateTime("20240229235959.123456-480"))}), isDone());
+    EXPECT_THAT(change({named("PurchaseDate", dateTime("00000000000000.000000+000"))}), isDone());
+    EXPECT_EQ(valueIn(current(), "PurchaseDate"), std::nullopt);
+    EXPECT_THAT(change({named("PurchaseDate", dateTime("00000000000000.000000-000"))}), isDone());
 }
 
 TEST_F(AssetTest, ReadOnlyPropertiesAreRefusedByName) {

@@ -62,9 +62,12 @@ TEST_F(RecordTest, ANewRecordNeedsAKey) {
     EXPECT_FALSE(std::filesystem::exists(dataFile("Lease.dat"))) << "nothing was written";
 }
 
-TEST_F(RecordTest, TwoKeysThatContradictEachOtherMakeNoRecord) {
-    EXPECT_THAT(create("L1", {named("InstanceID", text("L2"))}), isRefused(CMPI_RC_ERR_INVALID_PARAMETER, "L2"));
-    EXPECT_THAT(identifiers(), IsEmpty());
+TEST_F(RecordTest, OfTwoKeysThatOfThePathCounts) {
+    const Outcome outcome = create("L1", {named("InstanceID", text("L2")), named("Lessor", text("ACME"))});
+    EXPECT_THAT(outcome, isAnswered(1));
+    EXPECT_THAT(identifiersOf(outcome.paths()), ElementsAre("L1"));
+    EXPECT_THAT(identifiers(), ElementsAre("L1"));
+    EXPECT_EQ(valueIn(got("L1"), "Lessor"), "ACME");
 }
 
 TEST_F(RecordTest, ARecordThatIsThereIsNotCreatedAgain) {
@@ -94,6 +97,21 @@ TEST_F(RecordTest, ACreationWithAReadOnlyValueOfItsOwnMakesNoRecord) {
     EXPECT_THAT(identifiers(), IsEmpty());
     EXPECT_THAT(testsupport::readFile(dataFile("Lease.dat")), "0\n");
     EXPECT_THAT(create("L1", {named("ElementName", text("Lease Information"))}), isAnswered(1));
+}
+
+TEST_F(RecordTest, ARefusedCreationWritesNothingWhereAnotherRecordShowsWhatIsRight) {
+    create("L1", {named("Lessor", text("ACME"))});
+    const auto written = std::filesystem::last_write_time(dataFile("Lease.dat"));
+    const std::string stored = testsupport::readFile(dataFile("Lease.dat"));
+    agentEnvironment::forgetLog();
+    EXPECT_THAT(create("L2", {named("ElementName", text("mine"))}),
+                isRefused(CMPI_RC_ERR_INVALID_PARAMETER, "ElementName"));
+    EXPECT_THAT(create("L2", {named("ChangeableType", testsupport::uint16(1))}),
+                isRefused(CMPI_RC_ERR_INVALID_PARAMETER, "ChangeableType"));
+    EXPECT_EQ(testsupport::readFile(dataFile("Lease.dat")), stored);
+    EXPECT_EQ(std::filesystem::last_write_time(dataFile("Lease.dat")), written);
+    EXPECT_THAT(create("L2", {named("ElementName", text("Lease Information"))}), isAnswered(1));
+    EXPECT_THAT(identifiers(), ElementsAre("L1", "L2"));
 }
 
 TEST_F(RecordTest, WhatIsNotThereIsNotFound) {
@@ -187,6 +205,54 @@ TEST_F(RecordTest, AnInstanceThatComesBackAsItWasIsAccepted) {
     EXPECT_EQ(valueIn(got("L1"), "Lessor"), "Other");
 }
 
+TEST_F(RecordTest, ADateWithoutOffsetMayBeWrittenInEitherWay) {
+    create("L1", {named("BaseTermCommencementDate", dateTime("20260101000000.000000+000"))});
+    const std::string stored = testsupport::readFile(dataFile("Lease.dat"));
+    EXPECT_THAT(modify("L1", {named("BaseTermCommencementDate", dateTime("20260101000000.000000-000"))}), isDone());
+    EXPECT_EQ(testsupport::readFile(dataFile("Lease.dat")), stored) << "no change";
+    EXPECT_THAT(modify("L1", {named("BaseTermCommencementDate", dateTime("20260102000000.000000-000"))}), isDone());
+    EXPECT_EQ(valueIn(got("L1"), "BaseTermCommencementDate"), "20260102000000.000000-000");
+}
+
+TEST_F(RecordTest, ADateIsTakenAwayByZeros) {
+    for (const char* zeros : {"00000000000000.000000-000", "00000000000000.000000+000"}) {
+        create("L1", {named("BaseTermCommencementDate", dateTime("20260101000000.000000+060"))});
+        EXPECT_THAT(modify("L1", {named("BaseTermCommencementDate", dateTime(zeros))}), isDone()) << zeros;
+        EXPECT_EQ(valueIn(got("L1"), "BaseTermCommencementDate"), std::nullopt);
+        EXPECT_THAT(modify("L1", {named("BaseTermCommencementDate", dateTime(zeros))}), isDone()) << "again";
+        EXPECT_THAT(testsupport::readFile(dataFile("Lease.dat")), HasSubstr("\n00000000000000.000000-000\n"));
+        unload();
+        EXPECT_EQ(valueIn(got("L1"), "BaseTermCommencementDate"), std::nullopt);
+        remove("L1");
+    }
+}
+
+TEST_F(RecordTest, AModificationThatAManagerTrimsChangesNothingElse) {
+    testsupport::writeFile(dataFile("Lease.dat"),
+                           "1\nL1\n_Bail_Ren\xc3\xa9\n00000000000000.000000-000\n0\n0\n0\n0\n0\nACME_\n*\n*\n*\n0\n");
+    const Instance before = got("L1");
+    ASSERT_EQ(valueIn(before, "Lessor"), " Bail Ren\xc3\xa9");
+    ASSERT_EQ(valueIn(before, "BaseRent"), "ACME ");
+    for (const char* lessor : {"Bail Ren", "Bail Ren\xc3\xa9"}) {
+        EXPECT_THAT(modify("L1", {named("Lessor", text(lessor)), named("BaseRent", text("ACME")),
+                                  named("LeaseTerm", uint32(3))}),
+                    isDone());
+        EXPECT_EQ(valueIn(got("L1"), "Lessor"), valueIn(before, "Lessor"));
+        EXPECT_EQ(valueIn(got("L1"), "BaseRent"), "ACME ");
+    }
+    EXPECT_EQ(valueIn(got("L1"), "LeaseTerm"), "3");
+}
+
+TEST_F(RecordTest, ALastLetterOutsideAsciiCanBeTakenAwayByName) {
+    create("L1", {named("Lessor", text("Bail Ren\xc3\xa9"))});
+    const ObjectPath path = keyedPath(lease, "L1");
+    const Instance sent = testsupport::instance(path, {named("Lessor", text("Bail Ren"))});
+    EXPECT_THAT(gate().modifyInstance(path, sent), isDone());
+    EXPECT_EQ(valueIn(got("L1"), "Lessor"), "Bail Ren\xc3\xa9") << "it may just have come back";
+    EXPECT_THAT(gate().modifyInstance(path, sent, {{"Lessor"}}), isDone());
+    EXPECT_EQ(valueIn(got("L1"), "Lessor"), "Bail Ren");
+}
+
 TEST_F(RecordTest, AChangedReadOnlyPropertyIsRefusedByNameWithNothingChanged) {
     create("L1", {named("Lessor", text("ACME"))});
     const std::vector<NamedValue> readOnly{named("InstanceID", text("L2")), named("ElementName", text("mine")),
@@ -216,6 +282,25 @@ TEST_F(RecordTest, IntegersOfAnyTypeAreTakenWhenTheyFit) {
         EXPECT_THAT(modify("L1", {named("LeaseTerm", value)}), isRefused(CMPI_RC_ERR_TYPE_MISMATCH, "LeaseTerm"));
     }
     EXPECT_EQ(valueIn(got("L1"), "LeaseTerm"), "4294967295");
+}
+
+TEST_F(RecordTest, ValuesOfAnotherTypeAreRefusedByName) {
+    create("L1", {named("RenewalOption", boolean(true)), named("Lessor", text("ACME"))});
+    const std::vector<NamedValue> wrong{named("RenewalOption", text("true")),
+                                        named("RenewalOption", uint32(1)),
+                                        named("Lessor", uint32(1)),
+                                        named("Lessor", boolean(true)),
+                                        named("BaseTermCommencementDate", uint32(20260101)),
+                                        named("LeaseTerm", dateTime("20260101000000.000000+000"))};
+    for (const NamedValue& value : wrong) {
+        EXPECT_THAT(modify("L1", {value}), isRefused(CMPI_RC_ERR_TYPE_MISMATCH, value.name));
+        EXPECT_THAT(create("L2", {value}), isRefused(CMPI_RC_ERR_TYPE_MISMATCH, value.name));
+    }
+    EXPECT_EQ(valueIn(got("L1"), "RenewalOption"), "TRUE");
+    EXPECT_EQ(valueIn(got("L1"), "Lessor"), "ACME");
+    EXPECT_THAT(modify("L1", {named("BaseTermCommencementDate", text("20260101000000.000000+060"))}), isDone())
+        << "the text of a datetime";
+    EXPECT_THAT(identifiers(), ElementsAre("L1"));
 }
 
 TEST_F(RecordTest, DeletedRecordsAreGoneFromTableAndFile) {

@@ -2,9 +2,12 @@
 
 #include "support/Files.h"
 
+#include <dlfcn.h>
 #include <sys/resource.h>
 #include <sys/stat.h>
+#include <sys/statvfs.h>
 #include <csignal>
+#include <set>
 
 // Changes that cannot be stored.
 
@@ -37,6 +40,16 @@ public:
 private:
     rlimit before{};
     void (*handler)(int);
+};
+
+/** While one of these lives, file systems say that they are full. */
+struct NoRoom {
+    static inline int count = 0;
+
+    NoRoom() { ++count; }
+    ~NoRoom() { --count; }
+    NoRoom(const NoRoom&) = delete;
+    NoRoom& operator=(const NoRoom&) = delete;
 };
 
 /** What a change of a lease, each kind once, answers. */
@@ -106,16 +119,65 @@ TEST_F(StorageTest, WhenTheDiskIsFullAModificationIsTakenBack) {
     EXPECT_EQ(valueIn(got("L1"), "Lessor"), "ACME");
 }
 
-TEST_F(StorageTest, ADeletionThatDoesNotReachTheFileIsTold) {
-    create("L1");
+/** Every property of every lease, in no order. */
+std::multiset<std::string> content(const Outcome& leases) {
+    std::multiset<std::string> shown;
+    for (const Instance& instance : leases.instances()) {
+        std::string text;
+        for (const NamedValue& property : instance.properties) {
+            text += property.name + "=" + valueIn(instance, property.name).value_or("(null)") + ";";
+        }
+        shown.insert(text);
+    }
+    return shown;
+}
+
+TEST_F(StorageTest, ADeletionThatCannotBeStoredIsTakenBack) {
+    create("L1", {named("Lessor", text("ACME")), named("LeaseTerm", uint32(12)),
+                  named("RenewalOption", testsupport::boolean(true)),
+                  named("BaseTermCommencementDate", testsupport::dateTime("20260101000000.000000+060"))});
     create("L2");
+    create("L3", {named("Lessor", text("Other"))});
+    const auto before = content(gate().enumerateInstances(classPath(lease)));
     {
         const FullDisk disk(10);
-        EXPECT_THAT(remove("L1"), isRefused(CMPI_RC_ERR_FAILED, "Lease.dat"));
+        EXPECT_THAT(remove("L1"), isRefused(CMPI_RC_ERR_FAILED, "Lease.dat stays damaged"));
     }
+    EXPECT_EQ(content(gate().enumerateInstances(classPath(lease))), before);
+    EXPECT_THAT(identifiers(), ElementsAre("L2", "L3", "L1")) << "at the end of the table";
+    EXPECT_THAT(modify("L2", {named("LeaseTerm", uint32(0))}), isDone()) << "no change, so nothing is written";
     EXPECT_THAT(modify("L2", {named("LeaseTerm", uint32(1))}), isDone()) << "the next change brings all";
     unload();
-    EXPECT_THAT(identifiers(), ElementsAre("L2"));
+    EXPECT_THAT(identifiers(), ElementsAre("L2", "L3", "L1"));
+    EXPECT_EQ(valueIn(got("L1"), "Lessor"), "ACME");
+    EXPECT_THAT(remove("L1"), isDone());
+}
+
+TEST_F(StorageTest, AFileThatStaysDamagedIsTold) {
+    create("L1", {named("Lessor", text("ACME"))});
+    const FullDisk disk(10);
+    EXPECT_THAT(modify("L1", {named("LeaseTerm", uint32(1))}),
+                isRefused(CMPI_RC_ERR_FAILED, "Lease.dat stays damaged until the next change succeeds"));
+    EXPECT_THAT(create("L2"), isRefused(CMPI_RC_ERR_FAILED, "stays damaged"));
+    EXPECT_EQ(valueIn(got("L1"), "LeaseTerm"), "0");
+}
+
+TEST_F(StorageTest, WithoutRoomNothingIsTouched) {
+    create("L1", {named("LeaseTerm", uint32(1))});
+    const ObjectPath path = gate().enumerateInstanceNames(classPath(asset)).paths().front();
+    const std::string stored = readFile(dataFile("Lease.dat"));
+    const auto written = fs::last_write_time(dataFile("Lease.dat"));
+    {
+        const NoRoom room;
+        EXPECT_THAT(create("L2"), isRefused(CMPI_RC_ERR_FAILED, "No space left"));
+        EXPECT_THAT(modify("L1", {named("LeaseTerm", uint32(9))}), isRefused(CMPI_RC_ERR_FAILED, "No space left"));
+        EXPECT_THAT(gate().modifyInstance(path, testsupport::instance(path, {named("AssetNumber", text("A1"))})),
+                    isRefused(CMPI_RC_ERR_FAILED, "No space left"));
+        EXPECT_EQ(readFile(dataFile("Lease.dat")), stored);
+        EXPECT_EQ(fs::last_write_time(dataFile("Lease.dat")), written);
+        EXPECT_THAT(remove("L1"), isDone()) << "that makes room";
+    }
+    EXPECT_THAT(create("L2"), isAnswered(1));
 }
 
 TEST_F(StorageTest, AssetDataThatCannotBeStoredAreToldAndStayAsTheyWere) {
@@ -146,3 +208,14 @@ TEST_F(StorageTest, ADamagedFileIsMadeWholeByTheNextChange) {
 
 }  // namespace
 }  // namespace gatetest
+
+/** In the place of the system's, also for the libraries under test. */
+extern "C" __attribute__((visibility("default"))) int statvfs(const char* path, struct statvfs* system) noexcept {
+    static const auto real = reinterpret_cast<int (*)(const char*, struct statvfs*)>(dlsym(RTLD_NEXT, "statvfs"));
+    const int answer = real(path, system);
+    if (gatetest::NoRoom::count > 0) {
+        system->f_bfree = 0;
+        system->f_bavail = 0;
+    }
+    return answer;
+}

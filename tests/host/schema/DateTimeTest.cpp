@@ -37,5 +37,13 @@ INSTANTIATE_TEST_SUITE_P(NotTheForm, BadDateTime,
                                          "2026013112000*.******+000", "20260131120000.1*0000+000",
                                          "00000001250000.000000:000", "00000001120000.000000:060"));
 
+TEST(NoDateTime, IsNothingButZerosWithoutOffset) {
+    EXPECT_TRUE(isNoDateTime("00000000000000.000000-000"));
+    EXPECT_TRUE(isNoDateTime("00000000000000.000000+000"));
+    EXPECT_FALSE(isNoDateTime("00000000000000.000000+060"));
+    EXPECT_FALSE(isNoDateTime("00000000000000.000000:000"));
+    EXPECT_FALSE(isNoDateTime(""));
+}
+
 }  // namespace
 }  // namespace cimhost::test
