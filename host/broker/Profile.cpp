@@ -46,11 +46,19 @@ Profile openPegasusProfile() {
     profile.escape = Escape::unknownError;
     profile.created = CreationResult::pathOnly;
     profile.completesInstances = true;
-    profile.unreadableCreationKeys = true;
+    profile.creationKey = CreationKey::unreadable;
     profile.namesAllProperties = true;
     profile.refusesEmptyGet = true;
     profile.emptiesReferences = true;
     profile.trimsBlanks = true;
+    return profile;
+}
+
+Profile emptyKeyProfile() {
+    Profile profile = openPegasusProfile();
+    profile.manager = Manager::openPegasusEmptyKey;
+    profile.name = "pegasus-empty-key";
+    profile.creationKey = CreationKey::empty;
     return profile;
 }
 
@@ -69,8 +77,8 @@ void leaveMarksOnly(CMPIBrokerMemFT& memory) {
     memory.freeSelectExp = nullptr;
 }
 
-const Profile (&profiles())[3] {
-    static const Profile all[] = {standardProfile(), sfcbProfile(), openPegasusProfile()};
+const Profile (&profiles())[4] {
+    static const Profile all[] = {standardProfile(), sfcbProfile(), openPegasusProfile(), emptyKeyProfile()};
     return all;
 }
 

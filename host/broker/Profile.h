@@ -9,9 +9,10 @@ namespace cimhost {
 
 /** Object managers that this host can play. */
 enum class Manager {
-    standard,     ///< the host itself: what the standard promises, and helpful where it leaves a choice
-    sfcb,         ///< as SFCB 1.3 was seen to behave
-    openPegasus,  ///< as OpenPegasus was seen to behave
+    standard,             ///< the host itself: what the standard promises, and helpful where it leaves a choice
+    sfcb,                 ///< as SFCB 1.3 was seen to behave
+    openPegasus,          ///< as OpenPegasus was seen to behave
+    openPegasusEmptyKey,  ///< the same, where a new instance's path has a key that is empty instead of unreadable
 };
 
 /** Functions that the broker lacks. */
@@ -26,6 +27,13 @@ enum class RequestThread {
 
 /** What becomes of an exception that leaves a provider. */
 enum class Escape { failure, endOfProcess, unknownError };
+
+/** What a provider finds in the path of a new instance. */
+enum class CreationKey {
+    asSent,
+    unreadable,  ///< keys are counted, but have no value
+    empty        ///< keys have a value, which is an empty text
+};
 
 /** What a provider must return from CreateInstance. */
 enum class CreationResult {
@@ -44,9 +52,9 @@ struct Profile {
     RequestThread thread;
     Escape escape;
     CreationResult created;
+    CreationKey creationKey;
     bool completesInstances;      ///< all properties of the class are there at creation and modification, unset: null
     bool hollowTexts;             ///< unset texts, principal and role are string objects without characters
-    bool unreadableCreationKeys;  ///< keys of the path are counted at creation, but have no value
     bool namesAllProperties;      ///< the property list is never null, and that of a modification has the keys
     bool fillsAssociationClass;   ///< a provider is told the association class also when the client names none
     bool refusesEmptyGet;         ///< returnDone fails in GetInstance before an instance was returned
@@ -59,7 +67,7 @@ struct Profile {
 
 const Profile& profileOf(Manager manager);
 
-/** The manager of that name, "standard", "sfcb" or "pegasus"; none for another name. */
+/** The manager of that name, such as "sfcb"; none for another name. */
 std::optional<Manager> managerNamed(std::string_view name);
 
 /** Makes function tables look like the manager's: versions, and null pointers where it has no function. */

@@ -91,7 +91,7 @@ Format formatNamed(const std::string& word) {
 Manager managerCalled(const std::string& word) {
     const std::optional<Manager> manager = managerNamed(word);
     if (!manager) {
-        throw CLI::ValidationError("--as", word + " is not one of standard, sfcb and pegasus");
+        throw CLI::ValidationError("--as", word + " is not one of standard, sfcb, pegasus and pegasus-empty-key");
     }
     return *manager;
 }
@@ -124,8 +124,8 @@ void addCommonOptions(CLI::App& app, Arguments& arguments) {
     app.add_option_function<std::string>("--format", setFormat, "Form of the output: text (default), json or mof")
         ->type_name("FORM");
     const auto setManager = [&arguments](const std::string& word) { arguments.manager = managerCalled(word); };
-    app.add_option_function<std::string>("--as", setManager,
-                                         "Object manager to behave like: standard (default), sfcb or pegasus")
+    app.add_option_function<std::string>(
+           "--as", setManager, "Object manager to behave like: standard (default), sfcb, pegasus or pegasus-empty-key")
         ->type_name("MANAGER");
     const auto setColours = [&arguments](const std::string& word) { arguments.colours = coloursCalled(word); };
     app.add_option_function<std::string>("--color", setColours,

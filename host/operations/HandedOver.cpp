@@ -70,7 +70,16 @@ std::vector<NamedValue> allProperties(const std::vector<NamedValue>& given, cons
     return all;
 }
 
-/** The path of a creation: the keys of the class are those of the instance, or cannot be read. */
+/** What becomes of a key in the path of a new instance. */
+Value creationKey(const Value& sent, CreationKey played) {
+    if (played == CreationKey::asSent) {
+        return sent;
+    }
+    const bool isEmpty = played == CreationKey::empty && sent.type == CMPI_string;
+    return isEmpty ? Value{CMPI_string, false, false, {std::string{}}} : Value{sent.type, false, true, {}};
+}
+
+/** The path of a creation: the keys of the class are those of the instance, or say nothing. */
 void addCreationKeys(Request& request, const ClassShape* shape, const Profile& profile) {
     std::vector<NamedValue>& keys = request.path.keys;
     for (const PropertyShape& property : shape == nullptr ? std::vector<PropertyShape>{} : shape->properties) {
@@ -80,9 +89,7 @@ void addCreationKeys(Request& request, const ClassShape* shape, const Profile& p
         }
     }
     for (NamedValue& key : keys) {
-        if (profile.unreadableCreationKeys) {
-            key.value = Value{key.value.type, false, true, {}};
-        }
+        key.value = creationKey(key.value, profile.creationKey);
     }
 }
 

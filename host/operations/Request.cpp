@@ -3,9 +3,12 @@
 namespace cimhost {
 namespace {
 
-constexpr const char* names[] = {"EnumerateInstances", "EnumerateInstanceNames", "GetInstance", "CreateInstance",
-                                 "ModifyInstance",     "DeleteInstance",         "Associators", "AssociatorNames",
-                                 "References",         "ReferenceNames"};
+constexpr const char* names[] = {"EnumerateInstances", "EnumerateInstanceNames",
+                                 "GetInstance",        "CreateInstance",
+                                 "ModifyInstance",     "DeleteInstance",
+                                 "ExecQuery",          "Associators",
+                                 "AssociatorNames",    "References",
+                                 "ReferenceNames"};
 
 }  // namespace
 

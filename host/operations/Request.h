@@ -21,6 +21,7 @@ enum class Operation {
     createInstance,
     modifyInstance,
     deleteInstance,
+    execQuery,
     associators,
     associatorNames,
     references,
@@ -41,6 +42,8 @@ struct Request {
     Instance instance{};         ///< of createInstance and modifyInstance, handed over as it is
     AssociationFilter filter{};  ///< of the association operations
     ContextEntries context{};
+    std::string language{};  ///< of execQuery, as the query is
+    std::string query{};
 };
 
 /** Everything that one provider did in answer to a request. */

@@ -50,6 +50,9 @@ CMPIStatus call(CMPIInstanceMI* interface, const Request& request, RequestScope&
         case Operation::modifyInstance:
             return callEntry(table.modifyInstance, interface, context, result, path, scope.instance(request.instance),
                              properties);
+        case Operation::execQuery:
+            return callEntry(table.execQuery, interface, context, result, path, request.language.c_str(),
+                             request.query.c_str());
         default:
             return callEntry(table.deleteInstance, interface, context, result, path);
     }

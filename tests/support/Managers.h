@@ -1,5 +1,6 @@
 #pragma once
 
+#include <algorithm>
 #include <ostream>
 #include <string>
 
@@ -18,13 +19,15 @@ namespace testsupport {
 
 /** Every manager there is, for tests that hold for all of them. */
 inline const cimhost::Manager everyManager[] = {cimhost::Manager::standard, cimhost::Manager::sfcb,
-                                                cimhost::Manager::openPegasus};
+                                                cimhost::Manager::openPegasus, cimhost::Manager::openPegasusEmptyKey};
 
 /** Names tests by the manager that is their parameter. */
 struct ManagerName {
     template <class Info>
     std::string operator()(const Info& info) const {
-        return cimhost::profileOf(info.param).name;
+        std::string name = cimhost::profileOf(info.param).name;
+        std::replace(name.begin(), name.end(), '-', '_');
+        return name;
     }
 };
 

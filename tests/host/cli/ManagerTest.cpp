@@ -48,7 +48,7 @@ TEST(ManagerOption, AModificationHasAllPropertiesAndAListOfItsOwn) {
 TEST(ManagerOption, AnotherNameIsWrongUsage) {
     const Ended refused = run({"--as", "cimom", "ei", "Test_Box"});
     EXPECT_EQ(refused.status, 2);
-    EXPECT_THAT(refused.error, HasSubstr("cimom is not one of standard, sfcb and pegasus"));
+    EXPECT_THAT(refused.error, HasSubstr("cimom is not one of standard, sfcb, pegasus and pegasus-empty-key"));
 }
 
 }  // namespace

@@ -98,6 +98,7 @@ TEST_F(ManagerTest, ManagersHaveNames) {
     EXPECT_EQ(cimhost::managerNamed("standard"), Manager::standard);
     EXPECT_EQ(cimhost::managerNamed("sfcb"), Manager::sfcb);
     EXPECT_EQ(cimhost::managerNamed("pegasus"), Manager::openPegasus);
+    EXPECT_EQ(cimhost::managerNamed("pegasus-empty-key"), Manager::openPegasusEmptyKey);
     EXPECT_EQ(cimhost::managerNamed("SFCB"), std::nullopt);
     for (const Manager manager : testsupport::everyManager) {
         EXPECT_EQ(cimhost::profileOf(manager).manager, manager);
@@ -145,6 +146,11 @@ TEST_F(ManagerTest, CreationMayHaveAKeyThatIsCountedAndCannotBeRead) {
               "Witness_Thing.Name=(error 6, null); Name=a;Text=t;Size=(null);");
     manager().getInstance({}, path("Witness_Thing", "there"), {});
     EXPECT_THAT(seen(), StartsWith("Witness_Thing.Name=there;")) << "other operations have their keys";
+}
+
+TEST_F(ManagerTest, CreationMayHaveAKeyThatIsEmpty) {
+    as(Manager::openPegasusEmptyKey);
+    EXPECT_EQ(seenOfCreation({with("Text", text("t"))}), "Witness_Thing.Name=; Name=a;Text=t;Size=(null);");
 }
 
 TEST_F(ManagerTest, APathWithoutKeysTakesThemFromTheInstance) {
