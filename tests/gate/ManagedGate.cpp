@@ -1,6 +1,7 @@
 #include "ManagedGate.h"
 
 #include "operations/ClassShapes.h"
+#include "operations/Interpretation.h"
 #include "schema/MofReader.h"
 #include "support/Files.h"
 
@@ -36,9 +37,10 @@ cimhost::ProviderRegistry registryOf(std::initializer_list<const char*> files) {
 
 }  // namespace
 
-ManagedGate::ManagedGate(cimhost::Manager manager)
-    : host(std::make_unique<cimhost::ObjectManager>(optionsOf(manager),
-                                                    registryOf({GATE_REGISTRATION, COMPUTER_REGISTRATION}))) {}
+ManagedGate::ManagedGate(cimhost::Manager manager, Served served)
+    : host(std::make_unique<cimhost::ObjectManager>(
+          optionsOf(manager),
+          registryOf({served == Served::byGate ? GATE_REGISTRATION : PROVIDER_REGISTRATION, COMPUTER_REGISTRATION}))) {}
 
 std::vector<std::string> ManagedGate::identifiers(const std::string& className) {
     return identifiersOf(paths(className));
@@ -56,22 +58,33 @@ Instance ManagedGate::got(const ObjectPath& path) {
     return answer.value;
 }
 
+cimhost::Status ManagedGate::ask(const cimhost::Request& request) {
+    const auto answers = host->run(request);
+    cimhost::Status status = cimhost::statusOf(answers, request.operation);
+    if (request.operation == cimhost::Operation::getInstance) {
+        status = cimhost::oneInstance(answers, request.path).status;
+    } else if (request.operation == cimhost::Operation::createInstance) {
+        status = cimhost::createdPath(answers).status;
+    }
+    status.message.clear();
+    for (const cimhost::RawAnswer& answer : answers.value) {
+        status.message += answer.status.message;
+    }
+    return status;
+}
+
 cimhost::Status ManagedGate::create(const std::string& id, std::vector<NamedValue> properties, const std::string& of) {
     const ObjectPath path = keyedPath(of, id);
     properties.push_back(named("InstanceID", text(id)));
-    const auto answer = host->createInstance({}, path, testsupport::instance(path, std::move(properties)));
-    if (answer.ok()) {
-        EXPECT_EQ(testsupport::toText(answer.value), testsupport::toText(path));
-    }
-    return answer.status;
+    return ask({cimhost::Operation::createInstance, path, {}, {path, std::move(properties)}});
 }
 
 cimhost::Status ManagedGate::modify(const ObjectPath& path, std::vector<NamedValue> properties) {
-    return host->modifyInstance({}, path, testsupport::instance(path, std::move(properties)), {});
+    return ask({cimhost::Operation::modifyInstance, path, {}, {path, std::move(properties)}});
 }
 
 cimhost::Status ManagedGate::remove(const std::string& id, const std::string& of) {
-    return host->deleteInstance({}, keyedPath(of, id));
+    return ask({cimhost::Operation::deleteInstance, keyedPath(of, id)});
 }
 
 SilentLog::SilentLog() : before(testsupport::readFile(configuration())) {

@@ -5,13 +5,16 @@
 
 namespace gatetest {
 
+/** Who serves the classes. */
+enum class Served { byGate, byProvider };
+
 /**
- * An object manager that plays another one, with the gate and the provider of the computer systems registered, over
- * the classes of the schema. Its end closes the libraries.
+ * An object manager that plays another one, with the gate (or the provider itself) and the provider of the computer
+ * systems registered, over the classes of the schema. Its end closes the libraries.
  */
 class ManagedGate {
 public:
-    explicit ManagedGate(cimhost::Manager manager);
+    explicit ManagedGate(cimhost::Manager manager, Served served = Served::byGate);
 
     cimhost::ObjectManager& manager() { return *host; }
 
@@ -20,6 +23,11 @@ public:
     std::vector<std::string> identifiers(const std::string& className);
     std::vector<ObjectPath> paths(const std::string& className);
     Instance got(const ObjectPath& path);
+    ///@}
+
+    /** @name Requests that may fail: the status that the client gets, with the message that the provider itself gave */
+    ///@{
+    cimhost::Status ask(const cimhost::Request& request);
     cimhost::Status create(const std::string& id, std::vector<NamedValue> properties, const std::string& of = lease);
     cimhost::Status modify(const ObjectPath& path, std::vector<NamedValue> properties);
     cimhost::Status remove(const std::string& id, const std::string& of = lease);

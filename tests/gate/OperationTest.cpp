@@ -1,0 +1,100 @@
+#include "ManagedGate.h"
+#include "OperationRows.h"
+#include "Shown.h"
+#include "support/Managers.h"
+
+// Every operation of every class under every object manager: through the gate, and from the provider itself.
+
+namespace gatetest {
+namespace {
+
+using cimhost::Manager;
+using cimhost::RawAnswer;
+using testing::IsEmpty;
+using testing::Not;
+
+class OperationTest : public testing::TestWithParam<Manager> {
+protected:
+    OperationTest() { agentEnvironment::clear(); }
+    ~OperationTest() override { agentEnvironment::clear(); }
+
+    /** Who serves the classes starts anew with each request, over the same files. */
+    cimhost::Answer<std::vector<RawAnswer>> ask(const Row& row, Served served) {
+        agentEnvironment::clear();
+        writeRecords(recordsOfRows());
+        const DataFiles before;
+        ManagedGate gate(GetParam(), served);
+        auto answers = gate.manager().run(row.request);
+        got = shown(answers, row.request) + before.changes();
+        return answers;
+    }
+
+    std::string got;  ///< what the client got, and what became of the files
+    SilentLog silence;
+};
+
+/** A failure has a message of the provider's own and no answers; whatever else, none. */
+void expectStandardForm(const RawAnswer& answer) {
+    EXPECT_FALSE(answer.threw);
+    if (answer.status.ok()) {
+        EXPECT_FALSE(answer.hasMessage) << answer.status.message;
+    } else {
+        EXPECT_THAT(answer.status.message, Not(IsEmpty()));
+        EXPECT_THAT(answer.events, IsEmpty());
+    }
+}
+
+TEST_P(OperationTest, ThroughTheGateEveryOperationIsAnsweredAsTheStandardPromises) {
+    for (const Row& row : operationRows()) {
+        SCOPED_TRACE(row.name);
+        const auto answers = ask(row, Served::byGate);
+        EXPECT_EQ(got, row.gate);
+        EXPECT_THAT(answers.value, Not(IsEmpty()));
+        for (const RawAnswer& answer : answers.value) {
+            expectStandardForm(answer);
+        }
+    }
+}
+
+TEST_P(OperationTest, TheProviderItselfAnswersAsItAlwaysDid) {
+    for (const Row& row : operationRows()) {
+        SCOPED_TRACE(row.name);
+        const auto answers = ask(row, Served::byProvider);
+        EXPECT_EQ(got, row.bare.under(GetParam()));
+        for (const RawAnswer& answer : answers.value) {
+            EXPECT_FALSE(answer.threw);
+            EXPECT_FALSE(answer.hasMessage) << answer.status.message;
+        }
+    }
+}
+
+/** Creates two leases under a manager whose paths have empty keys. @return the identifiers after the next start */
+std::vector<std::string> afterEmptyKeys(Served served) {
+    agentEnvironment::clear();
+    writeRecords({"A"});
+    {
+        ManagedGate gate(Manager::openPegasusEmptyKey, served);
+        gate.create("B", {});
+        gate.create("C", {named("Lessor", text("ACME"))});
+        gate.modify(keyedPath(lease, "A"), {named("LeaseTerm", uint32(3))});
+    }
+    return ManagedGate(Manager::standard, served).identifiers(lease);
+}
+
+TEST(EmptyKeyTest, ThroughTheGateTheKeyIsThatOfTheInstance) {
+    EXPECT_THAT(afterEmptyKeys(Served::byGate), testing::ElementsAre("A", "B", "C"));
+    agentEnvironment::clear();
+}
+
+TEST(EmptyKeyTest, WithoutItAnEmptyIdentifierShiftsTheRecordsThatFollow) {
+    const auto identifiers = afterEmptyKeys(Served::byProvider);
+    EXPECT_THAT(identifiers, testing::Not(testing::Contains("B")));
+    EXPECT_THAT(identifiers, testing::Contains("*")) << "a line of the empty record's values is taken for its key";
+    agentEnvironment::clear();
+}
+
+INSTANTIATE_TEST_SUITE_P(Managers, OperationTest, testing::ValuesIn(testsupport::everyManager),
+                         testsupport::ManagerName());
+
+}  // namespace
+}  // namespace gatetest

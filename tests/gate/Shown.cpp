@@ -1,0 +1,168 @@
+#include "Shown.h"
+
+#include <algorithm>
+#include <sstream>
+
+#include "operations/Interpretation.h"
+#include "schema/MofWriter.h"
+#include "support/Files.h"
+
+namespace gatetest {
+
+namespace {
+
+using cimhost::Operation;
+using cimhost::RawAnswer;
+using Answers = cimhost::Answer<std::vector<RawAnswer>>;
+
+struct RecordFile {
+    const char* name;
+    const char* empty;  ///< a record as new, but for its identifier
+};
+
+constexpr RecordFile recordFiles[] = {
+    {"Lease.dat", "*\n00000000000000.000000-000\n0\n0\n0\n0\n0\n*\n*\n*\n*\n0\n"},
+    {"Warranty.dat", "*\n00000000000000.000000-000\n0\n"},
+};
+constexpr const char* otherFiles[] = {"asset.dat"};
+
+std::string contentOf(const std::string& name) {
+    const auto file = agentEnvironment::dataDirectory() / name;
+    return std::filesystem::exists(file) ? testsupport::readFile(file) : "";
+}
+
+std::string shown(const cimhost::Value& value) {
+    if (!value.isNull && value.elements.size() == 1) {
+        const cimhost::Scalar& only = value.elements.front();
+        if (const auto* characters = std::get_if<std::string>(&only)) {
+            return *characters;
+        }
+        if (const auto* path = std::get_if<std::shared_ptr<const ObjectPath>>(&only)) {
+            return gatetest::shown(**path);
+        }
+    }
+    return cimhost::formatMof(value);
+}
+
+std::vector<ObjectPath> pathsOf(const std::vector<Instance>& instances) {
+    std::vector<ObjectPath> paths;
+    for (const Instance& instance : instances) {
+        paths.push_back(instance.path);
+    }
+    return paths;
+}
+
+template <class Value>
+cimhost::Answer<std::vector<ObjectPath>> oneOf(cimhost::Answer<Value> answer, ObjectPath path) {
+    return {std::move(answer.status), {std::move(path)}};
+}
+
+/** What the client gets, whatever the operation. */
+cimhost::Answer<std::vector<ObjectPath>> toClient(const Answers& answers, const cimhost::Request& request) {
+    switch (request.operation) {
+        case Operation::getInstance: {
+            const auto found = cimhost::oneInstance(answers, request.path);
+            return oneOf(found, found.value.path);
+        }
+        case Operation::createInstance: {
+            const auto made = cimhost::createdPath(answers);
+            return oneOf(made, made.value);
+        }
+        case Operation::enumerateInstances:
+        case Operation::associators:
+        case Operation::references: {
+            const auto found = cimhost::resultsOf<Instance>(answers, request.operation);
+            return {found.status, pathsOf(found.value)};
+        }
+        default:
+            return cimhost::resultsOf<ObjectPath>(answers, request.operation);
+    }
+}
+
+bool isProvidersFailure(const Answers& answers) {
+    return std::any_of(answers.value.begin(), answers.value.end(),
+                       [](const RawAnswer& each) { return !each.status.ok(); });
+}
+
+/** The records of a file: identifier and first text, blanks for underscores, whatever the number of lines says. */
+std::string shownRecords(const std::string& content, const RecordFile& file) {
+    const std::string empty = file.empty;
+    const auto lines = 1 + std::count(empty.begin(), empty.end(), '\n');
+    std::istringstream stream(content);
+    std::string line;
+    std::getline(stream, line);
+    std::string all;
+    for (std::ptrdiff_t number = 0; std::getline(stream, line); ++number) {
+        std::replace(line.begin(), line.end(), '_', ' ');
+        if (number % lines == 0) {
+            all += " " + (line.empty() ? "(empty)" : line);
+        } else if (number % lines == 1 && line != "*") {
+            all += "(" + line + ")";
+        }
+    }
+    return all;
+}
+
+}  // namespace
+
+std::string shown(const ObjectPath& path) {
+    const std::string prefix = "VELKO_";
+    const bool isOurs = path.className.compare(0, prefix.size(), prefix) == 0;
+    std::string text = (isOurs ? path.className.substr(prefix.size()) : path.className) + "[";
+    for (const NamedValue& key : path.keys) {
+        text += (&key == path.keys.data() ? "" : ",") + shown(key.value);
+    }
+    return text + "]";
+}
+
+std::string shown(const Answers& answers, const cimhost::Request& request) {
+    const auto isFatal = [&](const RawAnswer& each) { return !cimhost::fatality(each, request.operation).empty(); };
+    if (std::any_of(answers.value.begin(), answers.value.end(), isFatal)) {
+        return "died";
+    }
+    const auto got = toClient(answers, request);
+    if (!got.ok()) {
+        return (isProvidersFailure(answers) ? "error " : "manager's error ") + std::to_string(got.status.rc);
+    }
+    std::string text;
+    for (const ObjectPath& path : got.value) {
+        text += (text.empty() ? "" : " ") + shown(path);
+    }
+    return text;
+}
+
+DataFiles::DataFiles() {
+    for (const RecordFile& file : recordFiles) {
+        contents.emplace_back(file.name, contentOf(file.name));
+    }
+    for (const char* name : otherFiles) {
+        contents.emplace_back(name, contentOf(name));
+    }
+}
+
+std::string DataFiles::changes() const {
+    std::string notes;
+    for (const auto& [name, before] : contents) {
+        const std::string now = contentOf(name);
+        if (now == before) {
+            continue;
+        }
+        notes += "; " + name;
+        for (const RecordFile& file : recordFiles) {
+            notes += name == file.name ? ":" + shownRecords(now, file) : "";
+        }
+    }
+    return notes;
+}
+
+void writeRecords(const std::vector<std::string>& identifiers) {
+    for (const RecordFile& file : recordFiles) {
+        std::string content = std::to_string(identifiers.size()) + "\n";
+        for (const std::string& id : identifiers) {
+            content += id + "\n" + file.empty;
+        }
+        testsupport::writeFile(agentEnvironment::dataDirectory() / file.name, content);
+    }
+}
+
+}  // namespace gatetest
