@@ -1,0 +1,31 @@
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+
+namespace fuzz {
+
+/** Takes decisions off an input, byte by byte; zeros when it is used up. */
+class Bytes {
+public:
+    Bytes(const std::uint8_t* data, std::size_t size) : next(data), end(data + size) {}
+
+    bool isUsedUp() const { return next == end; }
+
+    std::uint8_t byte() { return isUsedUp() ? std::uint8_t{0} : *next++; }
+
+    /** A number below the limit, which is not above 256. */
+    std::size_t below(std::size_t limit) { return byte() % limit; }
+
+    /** One of the elements. */
+    template <class Elements>
+    const auto& pick(const Elements& elements) {
+        return elements[below(elements.size())];
+    }
+
+private:
+    const std::uint8_t* next;
+    const std::uint8_t* end;
+};
+
+}  // namespace fuzz

@@ -1,0 +1,52 @@
+#pragma once
+
+#include "Bytes.h"
+
+#include "broker/UpCalls.h"
+#include "model/PropertyList.h"
+#include "model/Value.h"
+
+#include <optional>
+#include <string>
+
+// Requests as an input describes them.
+
+namespace fuzz {
+
+/** What is done: an operation of the function tables, or something around them. */
+enum class Action {
+    enumerateInstances,
+    enumerateInstanceNames,
+    getInstance,
+    createInstance,
+    modifyInstance,
+    deleteInstance,
+    execQuery,
+    cleanup,
+    associators,  ///< from here on those of the association interface
+    associatorNames,
+    references,
+    referenceNames,
+    associationCleanup,
+    restart,  ///< the library goes and comes again
+};
+
+/** A call with its arguments, of which it uses those that its action has; a null pointer where there is none. */
+struct Call {
+    Action action;
+    cimhost::ObjectPath path{};
+    cimhost::PropertyList properties{};
+    std::optional<cimhost::Instance> instance{};
+    cimhost::AssociationFilter filter{};
+};
+
+/** The call as people read it. */
+std::string toText(const Call& call);
+
+/** The next call that the input describes. */
+Call nextCall(Bytes& bytes);
+
+/** A text: mostly one that means something somewhere, else any bytes but 0. */
+std::string nextText(Bytes& bytes);
+
+}  // namespace fuzz
