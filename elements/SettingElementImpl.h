@@ -7,6 +7,7 @@
 #include "SettingElement.h"
 
 #include <exception>
+#include <new>
 #include <string>
 
 namespace KO::LeaseWarrantyProvider {
@@ -16,7 +17,10 @@ namespace {
 constexpr const char* computerKey = "Name";
 constexpr const char* elementKey = "InstanceID";
 
-/** Runs a moniker operation. Nothing but the two exception classes that it declares may leave it. */
+/**
+ * Runs a moniker operation. Nothing but the two exception classes that it declares may leave it: that memory is lacking
+ * is told as one of them, in a text that needs none; anything else ends the process.
+ */
 template <class Operation>
 Moniker throwingOnlyDeclared(Operation operation) {
     try {
@@ -25,6 +29,8 @@ Moniker throwingOnlyDeclared(Operation operation) {
         throw;
     } catch (const FrameworkException&) {
         throw;
+    } catch (const std::bad_alloc&) {
+        throw FrameworkException("out of memory");
     } catch (...) {
         std::terminate();
     }

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cctype>
+#include <iterator>
 
 namespace KO::LeaseWarrantyProvider {
 
@@ -18,11 +19,6 @@ bool extractOrKeep(std::istream& stream, Value& value) {
     }
     value = read;
     return true;
-}
-
-std::string replaced(std::string text, char from, char to) {
-    std::replace(text.begin(), text.end(), from, to);
-    return text;
 }
 
 }  // namespace
@@ -42,19 +38,21 @@ bool extract(std::istream& stream, std::string& word) {
     return extractOrKeep(stream, word);
 }
 
-std::string escaped(const std::string& text, TextForm form) {
-    switch (form) {
-        case TextForm::date:
-            return text.size() < dateLength ? defaultDate : text;
-        case TextForm::value:
-            if (text.size() <= 1) {
-                return emptyValue;
-            }
-            break;
-        case TextForm::identifier:
-            break;
+void writeEscaped(std::ostream& stream, const std::string& text, TextForm form) {
+    if (form == TextForm::date && text.size() < dateLength) {
+        stream << defaultDate;
+        return;
     }
-    return replaced(text, ' ', '_');
+    if (form == TextForm::value && text.size() <= 1) {
+        stream << emptyValue;
+        return;
+    }
+    const char blank = form == TextForm::date ? ' ' : '_';
+    const std::ostream::sentry ready(stream);
+    using Target = std::ostreambuf_iterator<char>;
+    if (ready && std::replace_copy(text.begin(), text.end(), Target(stream), ' ', blank).failed()) {
+        stream.setstate(std::ios::badbit);
+    }
 }
 
 std::string unescaped(const std::string& line, TextForm form) {
@@ -64,7 +62,9 @@ std::string unescaped(const std::string& line, TextForm form) {
     if (form == TextForm::value && line == emptyValue) {
         return {};
     }
-    return replaced(line, '_', ' ');
+    std::string text = line;
+    std::replace(text.begin(), text.end(), '_', ' ');
+    return text;
 }
 
 void endLine(std::ostream& stream) {

@@ -17,8 +17,11 @@ bool extract(std::istream& stream, bool& flag);            ///< the number 0 or 
 bool extract(std::istream& stream, std::string& word);     ///< up to the next white space
 ///@}
 
-/** What a line of a record file holds for a text. */
-std::string escaped(const std::string& text, TextForm form);
+/**
+ * Writes what a line of a record file holds for a text. Allocates nothing: a file that is being rewritten is not given
+ * up for lack of memory.
+ */
+void writeEscaped(std::ostream& stream, const std::string& text, TextForm form);
 
 /** The text for which a line of a record file stands. */
 std::string unescaped(const std::string& line, TextForm form);
@@ -43,7 +46,7 @@ template <class Unit, class Fields>
 void writeRecord(std::ostream& stream, const Unit& unit, const Fields& fields) {
     for (const auto& field : fields) {
         if (const auto* text = std::get_if<std::string Unit::*>(&field.member)) {
-            stream << escaped(unit.**text, field.form);
+            writeEscaped(stream, unit.**text, field.form);
         } else if (const auto* number = std::get_if<unsigned int Unit::*>(&field.member)) {
             stream << unit.**number;
         } else {

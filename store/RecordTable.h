@@ -3,6 +3,7 @@
 #include "RecordStream.h"
 
 #include <cstddef>
+#include <cstdio>
 #include <fstream>
 #include <locale>
 #include <string>
@@ -22,15 +23,11 @@ bool memoryCanHold(std::size_t count, std::size_t size);
 /** The path of a file of the agent's data directory. */
 std::string dataFilePath(const char* fileName);
 
-/**
- * Opens a record file in the classic locale: the process's own locale may group digits.
- * @return the stream, good or not
- */
+/** Opens a record file in the classic locale: the process's own locale may group digits. */
 template <class Stream>
-Stream openRecordFile(const std::string& path, std::ios::openmode mode) {
-    Stream stream(path, mode);
+void openRecordFile(Stream& stream, const std::string& path, std::ios::openmode mode) {
     stream.imbue(std::locale::classic());
-    return stream;
+    stream.open(path, mode);
 }
 
 /**
@@ -46,7 +43,8 @@ Stream openRecordFile(const std::string& path, std::ios::openmode mode) {
 template <class Unit>
 void loadRecords(const std::string& path, unsigned int& count, std::vector<Unit>& table) {
     table.reserve(reservedRecords);
-    auto stream = openRecordFile<std::ifstream>(path, std::ios::in);
+    std::ifstream stream;
+    openRecordFile(stream, path, std::ios::in);
     if (!stream.good()) {
         return;
     }
@@ -72,11 +70,15 @@ void loadRecords(const std::string& path, unsigned int& count, std::vector<Unit>
 
 /**
  * Rewrites a record file in place: the count, then each record in use.
+ * Lack of memory shows before the file is touched.
  * @return false when the file cannot be opened for writing; a write that fails is not noticed
  */
 template <class Unit>
 bool writeRecords(const std::string& path, unsigned int count, const std::vector<Unit>& table) {
-    auto stream = openRecordFile<std::ofstream>(path, std::ios::out | std::ios::trunc);
+    char buffer[BUFSIZ];  // opening empties the file: from then on nothing may be allocated
+    std::ofstream stream;
+    stream.rdbuf()->pubsetbuf(buffer, sizeof buffer);
+    openRecordFile(stream, path, std::ios::out | std::ios::trunc);
     if (!stream.good()) {
         return false;
     }

@@ -9,8 +9,10 @@
 
 namespace testsupport {
 
-TempDirectory::TempDirectory() {
-    std::string pattern = (std::filesystem::path(testing::TempDir()) / "law-XXXXXX").string();
+TempDirectory::TempDirectory() : TempDirectory(std::filesystem::path(testing::TempDir())) {}
+
+TempDirectory::TempDirectory(const std::filesystem::path& parent) {
+    std::string pattern = (parent / "law-XXXXXX").string();
     if (mkdtemp(pattern.data()) == nullptr) {
         throw std::runtime_error("cannot make a folder like " + pattern);
     }

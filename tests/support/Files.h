@@ -6,10 +6,12 @@
 
 namespace testsupport {
 
-/** A new, empty folder of this test's own under testing::TempDir(), removed with all it contains at the end. */
+/** A new, empty folder of this test's own, removed with all it contains at the end. */
 class TempDirectory {
 public:
+    /** In testing::TempDir(). */
     TempDirectory();
+    explicit TempDirectory(const std::filesystem::path& parent);
     ~TempDirectory();
     TempDirectory(const TempDirectory&) = delete;
     TempDirectory& operator=(const TempDirectory&) = delete;

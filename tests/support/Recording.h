@@ -20,6 +20,18 @@
 
 namespace testsupport {
 
+/** How deep this thread is inside the broker: what a test lets fail for a provider must not fail for its broker. */
+inline thread_local int insideBroker = 0;
+
+/** A thread is inside the broker while this lives. */
+class BrokerScope {
+public:
+    BrokerScope() { ++insideBroker; }
+    ~BrokerScope() { --insideBroker; }
+    BrokerScope(const BrokerScope&) = delete;
+    BrokerScope& operator=(const BrokerScope&) = delete;
+};
+
 /** What happens to a call instead of the real function. */
 struct Verdict {
     CMPIrc rc = CMPI_RC_OK;
@@ -144,6 +156,7 @@ struct Recorded<slot> {
     static inline Result (*original)(Arguments...) = nullptr;
 
     static Result call(Arguments... arguments) {
+        const BrokerScope scope;
         Recording* recording = recordingOf(tableOfCall(arguments...));
         if (recording == nullptr) {
             return original(arguments...);

@@ -30,6 +30,7 @@ constexpr const char* getMessage2Name = "CMPIBrokerEncFT.getMessage2";
 
 CMPIString* recordMessage(const char* function, const CMPIBroker* broker, const char* id, const char* text,
                           CMPIStatus* rc, CMPICount count, va_list inserts) {
+    const BrokerScope scope;
     Recording* recording = recordingOf(tableOf(broker));
     const auto verdict =
         recording == nullptr ? std::nullopt : recording->note({function, describeAll(broker, id, text, count)});
