@@ -7,7 +7,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerCMPIAssetIDDetail(LoggerNames::provider);
+std::string loggerCMPIAssetIDDetail = LoggerNames::kept(LoggerNames::provider);
 
 const TraceUnit AssetClass::unit{loggerCMPIAssetIDDetail, "CMPIAssetIDDetail.cpp"};
 

@@ -10,7 +10,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerCMPILAWComputerSystem(LoggerNames::provider);
+std::string loggerCMPILAWComputerSystem = LoggerNames::kept(LoggerNames::provider);
 
 namespace {
 

@@ -5,7 +5,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerCMPILease(LoggerNames::provider);
+std::string loggerCMPILease = LoggerNames::kept(LoggerNames::provider);
 
 const TraceUnit LeaseClass::unit{loggerCMPILease, "CMPILease.cpp"};
 

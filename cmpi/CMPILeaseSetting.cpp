@@ -5,7 +5,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerCMPILeaseSetting(LoggerNames::provider);
+std::string loggerCMPILeaseSetting = LoggerNames::kept(LoggerNames::provider);
 
 const TraceUnit LeaseSettingClass::unit{loggerCMPILeaseSetting, "CMPILeaseSetting.cpp"};
 

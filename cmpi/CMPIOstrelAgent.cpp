@@ -5,7 +5,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerCMPIOstrelAgent(LoggerNames::provider);
+std::string loggerCMPIOstrelAgent = LoggerNames::kept(LoggerNames::provider);
 
 const TraceUnit AgentClass::unit{loggerCMPIOstrelAgent, "CMPIOstrelAgent.cpp"};
 

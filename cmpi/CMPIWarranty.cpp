@@ -5,7 +5,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerCMPIWarranty(LoggerNames::provider);
+std::string loggerCMPIWarranty = LoggerNames::kept(LoggerNames::provider);
 
 const TraceUnit WarrantyClass::unit{loggerCMPIWarranty, "CMPIWarranty.cpp"};
 

@@ -5,7 +5,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerCMPIWarrantySetting(LoggerNames::provider);
+std::string loggerCMPIWarrantySetting = LoggerNames::kept(LoggerNames::provider);
 
 const TraceUnit WarrantySettingClass::unit{loggerCMPIWarrantySetting, "CMPIWarrantySetting.cpp"};
 

@@ -24,7 +24,7 @@ Mutex _fileMutex;
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerAssetIDDetails(LoggerNames::shortened);
+std::string loggerAssetIDDetails = LoggerNames::kept(LoggerNames::shortened);
 
 namespace {
 

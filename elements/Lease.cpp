@@ -5,7 +5,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerLease(LoggerNames::provider);
+std::string loggerLease = LoggerNames::kept(LoggerNames::provider);
 
 using Property = Properties::Lease;
 

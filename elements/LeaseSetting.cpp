@@ -5,7 +5,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerLeaseSetting(LoggerNames::provider);
+std::string loggerLeaseSetting = LoggerNames::kept(LoggerNames::provider);
 
 const TraceUnit LeaseSettingElement::unit{loggerLeaseSetting, "LeaseSetting.cpp"};
 

@@ -13,7 +13,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerOstrelAgent(LoggerNames::shortened);
+std::string loggerOstrelAgent = LoggerNames::kept(LoggerNames::shortened);
 
 namespace {
 

@@ -5,7 +5,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerWarranty(LoggerNames::provider);
+std::string loggerWarranty = LoggerNames::kept(LoggerNames::provider);
 
 using Property = Properties::Warranty;
 

@@ -5,7 +5,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerWarrantySetting(LoggerNames::provider);
+std::string loggerWarrantySetting = LoggerNames::kept(LoggerNames::provider);
 
 const TraceUnit WarrantySettingElement::unit{loggerWarrantySetting, "WarrantySetting.cpp"};
 

@@ -10,7 +10,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerLeaseAndWarrantyProvider(LoggerNames::provider);
+std::string loggerLeaseAndWarrantyProvider = LoggerNames::kept(LoggerNames::provider);
 
 /** The broker of the latest factory call. */
 const CMPIBroker* broker = nullptr;

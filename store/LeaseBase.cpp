@@ -5,7 +5,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerLeaseBase(LoggerNames::provider);
+std::string loggerLeaseBase = LoggerNames::kept(LoggerNames::provider);
 
 using Property = Properties::Lease;
 

@@ -38,7 +38,8 @@ void openRecordFile(Stream& stream, const std::string& path, std::ios::openmode 
  * hold, or that is no number, makes the file unreadable.
  *
  * @param count receives the number of records; left as it was, like the table, for an unreadable file
- * @throws std::bad_alloc when the process is refused the memory; the table may then hold some records
+ * @throws std::bad_alloc when the process is refused the memory, std::ios_base::failure when the file cannot be read to
+ *         its end; the table may then hold some records
  */
 template <class Unit>
 void loadRecords(const std::string& path, unsigned int& count, std::vector<Unit>& table) {
@@ -60,6 +61,7 @@ void loadRecords(const std::string& path, unsigned int& count, std::vector<Unit>
         }
         table.reserve(room);
     }
+    stream.exceptions(std::ios::badbit);
     Unit scratch;
     for (unsigned int record = 0; record < declared; ++record) {
         stream >> scratch;

@@ -5,7 +5,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerWarrantyBase(LoggerNames::provider);
+std::string loggerWarrantyBase = LoggerNames::kept(LoggerNames::provider);
 
 using Property = Properties::Warranty;
 

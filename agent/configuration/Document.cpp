@@ -49,11 +49,11 @@ Document Document::parse(std::string_view text, const std::string& name) {
         document.whatIsWrong = invalid(name, objection->line, objection->reason);
         return document;
     }
-    toml::parse_result result = toml::parse(text, name);
-    if (result) {
-        document.content->table = std::move(result).table();
-    } else {
-        document.whatIsWrong = invalid(name, result.error().source().begin.line, result.error().description());
+    try {
+        // The name is not for the parser: it would end the process where memory for a copy is lacking.
+        document.content->table = toml::parse(text);
+    } catch (const toml::parse_error& failure) {
+        document.whatIsWrong = invalid(name, failure.source().begin.line, failure.description());
     }
     return document;
 }

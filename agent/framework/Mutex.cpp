@@ -7,6 +7,7 @@
 
 #include <cerrno>
 #include <ctime>
+#include <new>
 
 namespace KO {
 
@@ -45,17 +46,19 @@ struct Mutex::Implementation {
     Implementation& operator=(const Implementation&) = delete;
 };
 
-Mutex::Mutex() : implementation(std::make_unique<Implementation>()) {}
+// Mutexes are static objects: where memory is lacking, it is lock() that fails, not the loading of their library.
+Mutex::Mutex() : implementation(new (std::nothrow) Implementation) {}
 Mutex::~Mutex() = default;
 
 void Mutex::lock(unsigned long timeout) {
-    pthread_mutex_t& mutex = implementation->mutex;
     int error = 0;
-    if (timeout >= withoutLimit) {
-        error = ::pthread_mutex_lock(&mutex);
+    if (implementation == nullptr) {
+        error = ENOMEM;
+    } else if (timeout >= withoutLimit) {
+        error = ::pthread_mutex_lock(&implementation->mutex);
     } else {
         const timespec end = afterMilliseconds(timeout);
-        error = ::pthread_mutex_clocklock(&mutex, CLOCK_MONOTONIC, &end);
+        error = ::pthread_mutex_clocklock(&implementation->mutex, CLOCK_MONOTONIC, &end);
     }
     if (error != 0) {
         throw FrameworkException(("Mutex cannot be locked: " + Agent::errorText(error)).c_str());
@@ -63,7 +66,9 @@ void Mutex::lock(unsigned long timeout) {
 }
 
 void Mutex::unlock() {
-    ::pthread_mutex_unlock(&implementation->mutex);
+    if (implementation != nullptr) {
+        ::pthread_mutex_unlock(&implementation->mutex);
+    }
 }
 
 }  // namespace KO

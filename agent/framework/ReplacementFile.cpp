@@ -41,6 +41,9 @@ public:
     void adoptAttributes(const std::string& target) {
         struct stat status {};
         if (::stat(target.c_str(), &status) != 0) {
+            if (errno != ENOENT) {
+                fail(target);
+            }
             status.st_mode = 0640;
         } else if (::fchown(file.get(), status.st_uid, status.st_gid) != 0) {
             // Only the superuser may give a file away; anybody else keeps it as its own.
@@ -77,10 +80,13 @@ private:
     OpenFile file;
 };
 
-/** The file that a path leads to; the path itself if there is none. */
+/** The file that a path leads to; the path itself if there is none. A link that cannot be followed is not replaced. */
 std::string followLinks(const std::string& path) {
     std::error_code error;
     const std::filesystem::path target = std::filesystem::canonical(path, error);
+    if (error && error != std::errc::no_such_file_or_directory) {
+        throwFileError("Cannot write ", path, error.value());
+    }
     return error ? path : target.string();
 }
 

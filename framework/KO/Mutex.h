@@ -17,7 +17,8 @@ public:
     /**
      * Waits for the lock and takes it.
      * @param timeout milliseconds to wait at most; 0xFFFFFFFF waits without limit
-     * @throws FrameworkException when the time is over, or when this thread has the lock already
+     * @throws FrameworkException when the time is over, when this thread has the lock already, or when memory was
+     *         lacking as the mutex was made
      */
     void lock(unsigned long timeout);
 

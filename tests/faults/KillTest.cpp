@@ -1,0 +1,95 @@
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <csignal>
+
+#include "Killing.h"
+
+// A process is killed before each of its operations in turn; another one then starts from the files.
+
+namespace faults {
+namespace {
+
+using testing::AnyOf;
+
+constexpr int records = 4;
+
+class KillTest : public testing::TestWithParam<Request> {
+protected:
+    static const Request& request() { return GetParam(); }
+    static std::string file() { return request().changes; }
+
+    void restart() {
+        FileContents files = scene.filesAtFirst();
+        files[leaseFile] = leaseRecords(records);
+        files[warrantyFile] = warrantyRecords(records);
+        scene.restart(files);
+        before = scene.files();
+    }
+
+    /** Kills a process that makes the request, before one of its operations. */
+    void killBefore(OperationKind kind, int number) {
+        restart();
+        const Fault fault{kind, number, false, 0, [] { std::raise(SIGKILL); }};
+        EXPECT_TRUE(isKilled([&] { scene.ask(request(), &fault); }));
+    }
+
+    void expectWholeOrBeginning(const FileContents& left) {
+        const std::string& content = left.at(file());
+        if (file() == assetFile) {
+            EXPECT_THAT(content, AnyOf(before.at(file()), whole.at(file())));
+            return;
+        }
+        EXPECT_THAT(content, AnyOf(before.at(file()), testing::ResultOf(
+                                                          "the file when nothing fails, cut off after a line",
+                                                          [&](const std::string& text) {
+                                                              return (text.empty() || text.back() == '\n') &&
+                                                                     whole.at(file()).rfind(text, 0) == 0;
+                                                          },
+                                                          true)));
+    }
+
+    Scene scene;
+    FileContents before;
+    FileContents whole;
+};
+
+TEST_P(KillTest, EveryPointLeavesAssetDataWholeAndOfRecordsTheBeginningInWholeLines) {
+    restart();
+    const Counts counts = scene.ask(request()).counts;
+    whole = scene.files();
+    for (const auto& [kind, count] : counts) {
+        for (int number = 1; kind != operationAllocate && number <= count && !HasFailure(); ++number) {
+            SCOPED_TRACE(std::string("killed before ") + nameOf(kind) + " number " + std::to_string(number));
+            killBefore(kind, number);
+            FileContents left = scene.files();
+            for (const auto& [name, content] : before) {
+                if (name != file()) {
+                    EXPECT_EQ(left.at(name), content);
+                }
+            }
+            EXPECT_LE(left.size(), before.size() + (file() == assetFile ? 1 : 0)) << "one temporary file at most";
+            expectWholeOrBeginning(left);
+            EXPECT_EQ(scene.ask(repairOf(file())).outcome.rc, CMPI_RC_OK) << "the next process serves";
+            EXPECT_EQ(scene.ask(request()).outcome.rc, CMPI_RC_OK);
+        }
+    }
+}
+
+INSTANTIATE_TEST_SUITE_P(Requests, KillTest, testing::ValuesIn(changingRequests()),
+                         [](const auto& tested) { return tested.param.name; });
+
+TEST(KillStateTest, TellsWholeFilesFromOthers) {
+    EXPECT_EQ(stateOf(leaseRecords(3), linesOfLease), FileState::whole);
+    EXPECT_EQ(stateOf(warrantyRecords(3), linesOfWarranty), FileState::whole);
+    EXPECT_EQ(stateOf("0\n", linesOfLease), FileState::whole);
+    EXPECT_EQ(stateOf("", linesOfLease), FileState::empty);
+    const std::string cut = leaseRecords(3).substr(0, leaseRecords(2).size() + 20);
+    EXPECT_EQ(stateOf(cut, linesOfLease), FileState::cutOff);
+    EXPECT_EQ(wholeRecordsIn(cut, linesOfLease), 2);
+    EXPECT_EQ(wholeRecordsIn("", linesOfLease), 0);
+}
+
+}  // namespace
+}  // namespace faults

@@ -1,0 +1,30 @@
+#pragma once
+
+#include <sys/types.h>
+
+#include <functional>
+#include <string>
+
+#include "Scene.h"
+
+namespace faults {
+
+/** What a file of records looks like from outside. */
+enum class FileState { whole, empty, cutOff };
+
+/** A file of records with so many lines a record. Whole: as many lines as its count promises, each ended. */
+FileState stateOf(const std::string& content, int linesOfRecord);
+
+/** How many records a file has all lines of, whatever its count says. */
+int wholeRecordsIn(const std::string& content, int linesOfRecord);
+
+constexpr int linesOfLease = 13;
+constexpr int linesOfWarranty = 4;
+
+/** Waits for a child process. @return whether it was killed by SIGKILL; std::runtime_error after any other bad end */
+bool waitForEnd(pid_t child);
+
+/** Runs work in a process of its own. @return whether it was killed by SIGKILL; else it came to its end */
+bool isKilled(const std::function<void()>& work);
+
+}  // namespace faults

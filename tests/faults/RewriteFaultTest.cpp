@@ -1,0 +1,202 @@
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <cerrno>
+#include <filesystem>
+#include <sstream>
+
+#include "Scene.h"
+
+// What a failure in the middle of a rewrite leaves of a file of records. docs/data-files.md gives these figures.
+
+namespace faults {
+namespace {
+
+namespace fs = std::filesystem;
+using testing::AnyOf;
+
+constexpr int leases = 10;
+constexpr int linesOfLease = 13;
+constexpr int writesOfRewrite = 1 + leases * linesOfLease;
+
+class RewriteFaultTest : public testing::Test {
+protected:
+    RewriteFaultTest() { restart(); }
+
+    void restart() {
+        FileContents files = scene.filesAtFirst();
+        files[leaseFile] = leaseRecords(leases);
+        scene.restart(files);
+    }
+
+    /** A rewrite with a fault in it; gives what is left of the file. */
+    std::string rewriteWith(const Fault& fault) {
+        restart();
+        const Done done = scene.ask(requestNamed("ModifyLease"), &fault);
+        EXPECT_EQ(done.outcome.rc, CMPI_RC_OK);
+        return scene.files().at(leaseFile);
+    }
+
+    static Fault writeFailing(int number, bool lasting, int error = ENOSPC) {
+        return {operationWrite, number, lasting, error, {}};
+    }
+
+    std::string wholeFile() {
+        restart();
+        scene.ask(requestNamed("ModifyLease"));
+        return scene.files().at(leaseFile);
+    }
+
+    static std::string firstLines(const std::string& text, int count) {
+        std::size_t end = 0;
+        for (int line = 0; line < count; ++line) {
+            end = text.find('\n', end) + 1;
+        }
+        return text.substr(0, end);
+    }
+
+    /** Each lease's lines, as clients see them. */
+    std::vector<Lines> leasesListed() {
+        std::vector<Lines> listed;
+        for (const std::string& line : scene.instancesOf("VELKO_Lease")) {
+            if (line.rfind("InstanceID=", 0) == 0) {
+                listed.emplace_back();
+            }
+            listed.back().push_back(line);
+        }
+        return listed;
+    }
+
+    Scene scene;
+};
+
+TEST_F(RewriteFaultTest, HandsEachLineToTheSystemInAWriteOfItsOwn) {
+    Counts counts = scene.ask(requestNamed("ModifyLease")).counts;
+    EXPECT_EQ(counts[operationWrite], writesOfRewrite);
+    EXPECT_EQ(counts[operationOpen], 1);
+    EXPECT_EQ(counts[operationClose], 1);
+    EXPECT_EQ(counts[operationSync], 0) << "nothing is forced to the disk";
+}
+
+TEST_F(RewriteFaultTest, ADiskThatIsFullFromALineOnKeepsTheLinesBeforeIt) {
+    const std::string whole = wholeFile();
+    for (int number = 1; number <= writesOfRewrite; ++number) {
+        ASSERT_EQ(rewriteWith(writeFailing(number, true)), firstLines(whole, number - 1));
+    }
+}
+
+TEST_F(RewriteFaultTest, ALineThatFailsOnceIsTheLast) {
+    const std::string whole = wholeFile();
+    for (int number = 1; number <= writesOfRewrite; ++number) {
+        ASSERT_EQ(rewriteWith(writeFailing(number, false)), firstLines(whole, number))
+            << "it is written when the file is closed, and nothing after it";
+    }
+}
+
+TEST_F(RewriteFaultTest, WhatIsWrittenInPartsOrInterruptedIsWrittenToItsEnd) {
+    const std::string whole = wholeFile();
+    for (const int number : {1, 2, writesOfRewrite / 2, writesOfRewrite}) {
+        EXPECT_EQ(rewriteWith(writeFailing(number, false, EINTR)), whole);
+        EXPECT_EQ(rewriteWith(writeFailing(number, true, 0)), whole) << "each in parts";
+    }
+}
+
+TEST_F(RewriteFaultTest, LackOfMemoryKeepsTheFileAsItWasOrWritesItWhole) {
+    const std::string before = leaseRecords(leases);
+    const std::string whole = wholeFile();
+    Counts counts = scene.ask(requestNamed("ModifyLease")).counts;
+    int written = 0;
+    for (int number = 1; number <= counts[operationAllocate]; ++number) {
+        const std::string content = rewriteWith({operationAllocate, number, true, 0, {}});
+        EXPECT_EQ(std::count(content.begin(), content.end(), '\n'), writesOfRewrite);
+        written += content == before ? 0 : 1;
+    }
+    EXPECT_LT(written, counts[operationAllocate]);
+}
+
+TEST_F(RewriteFaultTest, AfterARestartTheRecordsBeforeTheGapAreThereAndCopiesStandForTheRest) {
+    wholeFile();
+    const std::vector<Lines> before = leasesListed();
+    EXPECT_EQ(rewriteWith(writeFailing(1, true)), "");
+    scene.unload();
+    EXPECT_EQ(leasesListed().size(), 0U) << "an empty file is no lease";
+    for (int number = 2; number <= writesOfRewrite; ++number) {
+        SCOPED_TRACE(number);
+        rewriteWith(writeFailing(number, true));
+        scene.unload();
+        const std::vector<Lines> listed = leasesListed();
+        const auto intact = static_cast<std::size_t>((number - 2) / linesOfLease);
+        ASSERT_EQ(listed.size(), before.size());
+        EXPECT_TRUE(std::equal(before.begin(), before.begin() + static_cast<std::ptrdiff_t>(intact), listed.begin()));
+        for (std::size_t copy = intact + 1; copy < listed.size(); ++copy) {
+            EXPECT_EQ(listed[copy], listed[intact]);
+        }
+    }
+}
+
+TEST_F(RewriteFaultTest, TheNextChangeInTheSameProcessWritesEverything) {
+    const std::string whole = wholeFile();
+    for (const int number : {1, 2, 60, writesOfRewrite}) {
+        rewriteWith(writeFailing(number, true));
+        scene.ask(repairOf(leaseFile));
+        EXPECT_EQ(scene.files().at(leaseFile), whole);
+    }
+}
+
+TEST_F(RewriteFaultTest, AFileWhoseCountIsPutRightLosesNoneOfItsWholeRecords) {
+    const int intact = 4;
+    const std::string rest = rewriteWith(writeFailing(2 + intact * linesOfLease + 5, true));
+    scene.unload();
+    FileContents files = scene.files();
+    files[leaseFile] = std::to_string(intact) + rest.substr(rest.find('\n'));
+    scene.restart(files);
+    EXPECT_EQ(leasesListed().size(), static_cast<std::size_t>(intact));
+    scene.ask(repairOf(leaseFile));
+    EXPECT_EQ(scene.files().at(leaseFile),
+              std::to_string(intact) + firstLines(rest, 1 + intact * linesOfLease).substr(2));
+}
+
+/** The data directory goes while a request works. */
+class VanishingDirectoryTest : public testing::TestWithParam<Request> {
+protected:
+    void vanishAt(OperationKind kind, int number) {
+        const fs::path data = scene.dataDirectory();
+        const fs::path away = scene.directory() / "away";
+        scene.restart();
+        scene.library();
+        const Fault fault{kind, number, false, 0, [&] { fs::rename(data, away); }};
+        const Done done = scene.ask(GetParam(), &fault);
+        EXPECT_EQ(done.outcome.rc, CMPI_RC_OK);
+        EXPECT_FALSE(done.outcome.threw);
+        EXPECT_EQ(scene.ask(repairOf(GetParam().changes)).outcome.rc, CMPI_RC_OK) << "also while it is gone";
+        EXPECT_FALSE(fs::exists(data)) << "nobody makes it";
+        fs::rename(away, data);
+    }
+
+    Scene scene;
+};
+
+TEST_P(VanishingDirectoryTest, LeavesTheProviderAtWorkAndTheNextChangeStoresEverything) {
+    const std::string file = GetParam().changes;
+    scene.ask(GetParam());
+    Counts counts = scene.ask(GetParam()).counts;
+    scene.restart();
+    counts = scene.ask(GetParam()).counts;
+    for (const auto& [kind, count] : counts) {
+        for (int number = 1; kind != operationAllocate && number <= count; ++number) {
+            SCOPED_TRACE(std::string(nameOf(kind)) + " number " + std::to_string(number));
+            vanishAt(kind, number);
+            EXPECT_EQ(scene.ask(repairOf(file)).outcome.rc, CMPI_RC_OK);
+            const Lines kept = scene.instancesOf(classOf(file));
+            scene.unload();
+            EXPECT_EQ(scene.instancesOf(classOf(file)), kept);
+        }
+    }
+}
+
+INSTANTIATE_TEST_SUITE_P(Requests, VanishingDirectoryTest, testing::ValuesIn(changingRequests()),
+                         [](const auto& tested) { return tested.param.name; });
+
+}  // namespace
+}  // namespace faults
