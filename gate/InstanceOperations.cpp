@@ -92,16 +92,11 @@ void orUndone(const Target& target, Change change, Undo undo) {
     }
 }
 
-/** Makes the changes; when they cannot be stored, the provider is given the old values back. */
+/** Makes the changes; fails unless they are stored. */
 void apply(const Provider& provider, const Target& target, const CMPIInstance* current, const Values& changes) {
-    const OwnInstance wanted(changed(target.owner, current, changes));
-    const OwnInstance undone(changed(target.owner, current, undoing(changes, current)));
-    const auto change = [&] {
-        provider.modify(target.path, wanted);
-        requireChanged(target.file, current, existing(provider, target.path, target.owner), changes);
-        target.requireStored();
-    };
-    orUndone(target, change, [&] { provider.modify(target.path, undone); });
+    provider.modify(target.path, OwnInstance(changed(target.owner, current, changes)));
+    requireChanged(target.file, current, existing(provider, target.path, target.owner), changes);
+    target.requireStored();
 }
 
 /** The identifier of a new record: from the path or, where that has none, from the instance. */
@@ -234,7 +229,9 @@ void modifyInstance(const Request& request, const CMPIInstance* instance, const 
     requireKept(file, changes);
     if (!changes.empty()) {
         file.requireWritable(sizeOf(changes));
-        apply(provider, target, current, changes);
+        const OwnInstance undone(changed(requested, current, undoing(changes, current)));
+        orUndone(
+            target, [&] { apply(provider, target, current, changes); }, [&] { provider.modify(target.path, undone); });
     }
 }
 

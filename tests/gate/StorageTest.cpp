@@ -106,6 +106,17 @@ TEST_F(StorageTest, WhenTheDiskIsFullANewRecordIsTakenBack) {
     EXPECT_THAT(create("L2"), isAnswered(1));
 }
 
+TEST_F(StorageTest, WhenTheDiskIsFullANewRecordIsTakenBackWithItsValues) {
+    create("L1", {named("LeaseTerm", uint32(1))});
+    const std::string stored = readFile(dataFile("Lease.dat"));
+    const FullDisk disk(2 * stored.size() + 10);
+    const Outcome outcome = create("L2", {named("Lessor", text(std::string(100, 'A')))});
+    EXPECT_THAT(outcome, isRefused(CMPI_RC_ERR_FAILED, "disk may be full"));
+    EXPECT_THAT(outcome.message, testing::Not(HasSubstr("damaged"))) << "it is whole again";
+    EXPECT_EQ(readFile(dataFile("Lease.dat")), stored);
+    EXPECT_THAT(identifiers(), ElementsAre("L1"));
+}
+
 TEST_F(StorageTest, WhenTheDiskIsFullAModificationIsTakenBack) {
     create("L1", {named("Lessor", text("ACME"))});
     create("L2");
