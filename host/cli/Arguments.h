@@ -23,7 +23,8 @@ struct LoadArguments {
     std::optional<std::string> associationClass{};
     bool fills = false;
     bool keeps = false;
-    std::size_t shown = 10;
+    bool isTrusting = false;
+    std::string shown{};  ///< a number or "all"; empty: what suits the form of the output
 };
 
 /** The command line, as it was given. */

@@ -49,7 +49,10 @@ void addLoadCommand(CLI::App& app, Arguments& arguments) {
     sub->add_option("--assoc-class", load.associationClass, "Association to follow from there")->type_name("CLASS");
     sub->add_flag("--fill", load.fills, "Send values along at creation, and expect them to be there");
     sub->add_flag("--keep", load.keeps, "Leave the instances there at the end");
-    sub->add_option("--show", load.shown, "How many wrong answers to show")->type_name("NUMBER")->capture_default_str();
+    sub->add_flag("--no-probes", load.isTrusting, "Ask only for what is there, create only what is not");
+    sub->add_option("--show", load.shown, "How many wrong answers to show, or all; usually 10, in JSON all")
+        ->type_name("NUMBER")
+        ->check(CLI::IsMember({"all"}) | CLI::Range(std::size_t{0}, std::size_t{100'000'000}));
     sub->callback([&arguments] { arguments.isLoad = true; });
 }
 

@@ -1,5 +1,7 @@
 #include "cli/LoadCommand.h"
 
+#include <limits>
+
 #include "cli/ExitStatus.h"
 #include "cli/LoadOutput.h"
 #include "load/Load.h"
@@ -15,6 +17,12 @@ load::Mix mixOf(const LoadArguments& arguments) {
         return load::Mix(arguments.mix);
     }
     return arguments.source.empty() ? load::Mix() : load::Mix(usualMixWithAssociations);
+}
+
+std::size_t shownOf(const Arguments& arguments) {
+    const std::string& given = arguments.load.shown;
+    const bool isAll = given == "all" || (given.empty() && arguments.format == Format::json);
+    return isAll ? std::numeric_limits<std::size_t>::max() : std::stoul(given.empty() ? "10" : given);
 }
 
 load::Plan planOf(const Arguments& arguments, const Schema& schema) {
@@ -38,7 +46,8 @@ load::Plan planOf(const Arguments& arguments, const Schema& schema) {
     plan.fills = given.fills;
     plan.keeps = given.keeps;
     plan.listsChanges = arguments.manager != Manager::sfcb;
-    plan.shown = given.shown;
+    plan.probes = !given.isTrusting;
+    plan.shown = shownOf(arguments);
     return plan;
 }
 

@@ -16,6 +16,11 @@ Ledger::Values byName(const std::vector<NamedValue>& values) {
     return map;
 }
 
+/** Whether it is done to an instance that is there. */
+bool needsInstance(Deed deed) {
+    return deed == Deed::modify || deed == Deed::remove || deed == Deed::get;
+}
+
 /** "died" when the object manager's provider process would have ended with the answer. */
 Verdict judgeFatal(const Answer<std::vector<RawAnswer>>& answers, Operation operation) {
     for (const RawAnswer& each : answers.value) {
@@ -47,6 +52,9 @@ void Client::run(std::size_t requests) {
 
 void Client::take() {
     turn = {random.below(plan.classes.size()), plan.mix.pick(random), {}, {}};
+    if (needsInstance(turn.deed) && ledger().isEmpty() && !plan.probes) {
+        turn.deed = Deed::create;
+    }
     ++asked;
     Verdict verdict = act();
     found.count(turn.deed, turn.time, verdict.has_value());
@@ -86,7 +94,7 @@ Verdict Client::judge(const Answers& answers, const Status& status, Operation op
 }
 
 Verdict Client::create() {
-    if (!ledger().isEmpty() && random.oneIn(16)) {
+    if (!ledger().isEmpty() && plan.probes && random.oneIn(16)) {
         return createAgain();
     }
     const std::string id = newId();

@@ -58,7 +58,7 @@ private:
     Ledger& ledger() { return known[turn.index]; }
     std::string newId();
     std::string missingId();  ///< what it deleted last, or never makes; good for every class
-    bool probes() { return ledger().isEmpty() || random.oneIn(16); }
+    bool probes() { return ledger().isEmpty() || (plan.probes && random.oneIn(16)); }
     std::vector<NamedValue> someValues();
 
     ObjectManager& manager;

@@ -22,6 +22,7 @@ struct Plan {
     bool fills = false;        ///< values go along at creation
     bool keeps = false;        ///< what is there at the end stays there
     bool listsChanges = true;  ///< modifications send the list of what they change
+    bool probes = true;        ///< now and then asks for what is not there, and creates what is there already
     std::size_t shown = 10;    ///< how many wrong answers are told in words
 };
 

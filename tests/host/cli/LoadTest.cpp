@@ -59,6 +59,26 @@ TEST(LoadCommand, IsJsonForPrograms) {
     EXPECT_THAT(wrong["wrongAnswers"]["first"][0]["request"], HasSubstr("CreateInstance"));
 }
 
+TEST(LoadCommand, ShowsTenWrongAnswersOrAll) {
+    const std::vector<std::string> liar{"load", "Depot_Liar", "--requests", "800"};
+    const auto report = reportOf(liar, 1);
+    const auto count = report["wrongAnswers"]["count"].get<std::size_t>();
+    ASSERT_GT(count, 10U);
+    EXPECT_EQ(report["wrongAnswers"]["first"].size(), count) << "a program gets them all";
+    const auto shownBy = [&](std::vector<std::string> more) {
+        more.insert(more.begin(), liar.begin(), liar.end());
+        const std::string output = runDepot(more).output;
+        std::size_t shown = 0;
+        for (auto at = output.find("expected: "); at != std::string::npos; at = output.find("expected: ", at + 1)) {
+            ++shown;
+        }
+        return shown;
+    };
+    EXPECT_EQ(shownBy({}), 10U);
+    EXPECT_EQ(shownBy({"--show", "all"}), count);
+    EXPECT_EQ(shownBy({"--show", "0"}), 0U);
+}
+
 TEST(LoadCommand, TakesClassesMixAndAssociations) {
     const auto report = reportOf({"load", "Depot_Thing", "Depot_Sealed", "--mix", "create=1,associate=1", "--source",
                                   "Depot_Thing.Name=\"x\"", "--assoc-class", "Depot_Holds", "--requests", "100"},
@@ -89,6 +109,7 @@ TEST(LoadCommand, SaysWhatIsWrongWithTheCommandLine) {
         {{"load", "Depot_Thing", "--mix", "associate=1"}, "no instance whose associations"},
         {{"load", "Depot_Thing", "--clients", "0"}, "--clients"},
         {{"load", "Depot_Thing", "--requests", "many"}, "--requests"},
+        {{"load", "Depot_Thing", "--show", "some"}, "--show"},
         {{"--raw", "load", "Depot_Thing"}, "load has many"},
         {{"--format", "mof", "load", "Depot_Thing"}, "--format mof shows instances"},
     };

@@ -110,6 +110,13 @@ TEST_F(LoadTest, OnlyOneThingIsWrongWhereOnlyOneThingIs) {
     }
 }
 
+TEST_F(LoadTest, WithoutProbesOnlyWhatIsThereIsAskedFor) {
+    EXPECT_THAT(run({"Depot_Polite"}).kinds, testing::Contains(Key("status"))) << "success for what is not there";
+    plan.probes = false;
+    EXPECT_THAT(run({"Depot_Polite"}).kinds, IsEmpty());
+    EXPECT_THAT(run({"Depot_Liar"}).kinds, testing::Contains(Key("value")));
+}
+
 TEST_F(LoadTest, AssociationsThatChangeAreWrong) {
     plan.source = depotClass().instancePath("any");
     plan.associationClass = "Depot_Wandering";
