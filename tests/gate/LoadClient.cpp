@@ -1,0 +1,207 @@
+#include "LoadClient.h"
+
+#include <set>
+
+namespace gatetest {
+
+namespace {
+
+using testsupport::Form;
+using testsupport::ModelRecord;
+using testsupport::RecordModel;
+
+/** Some value of a field as the model writes it. */
+std::string valueOf(Form form, int number) {
+    switch (form) {
+        case Form::number:
+            return std::to_string(number);
+        case Form::flag:
+            return number % 2 == 0 ? "0" : "1";
+        case Form::date:
+            return std::to_string(20'200'101'000'000 + number) + ".000000+060";
+        default:
+            return "Text of " + std::to_string(number);
+    }
+}
+
+cimhost::Value cimValue(Form form, const std::string& value) {
+    switch (form) {
+        case Form::number:
+            return uint32(static_cast<std::uint32_t>(std::stoul(value)));
+        case Form::flag:
+            return testsupport::boolean(value == "1");
+        case Form::date:
+            return testsupport::dateTime(value);
+        default:
+            return text(value);
+    }
+}
+
+/** Whether an instance shows all values of a record. */
+bool shows(const LoadedKind& kind, const Instance& instance, const ModelRecord& record) {
+    const RecordModel model(kind.fields);
+    return model.shownFields(instance) == model.shown(record);
+}
+
+ObjectPath assetPath() {
+    return testsupport::objectPath(nameSpace, asset,
+                                   {named("IdentifyingNumber", text("/system")), named("Name", text("alpha")),
+                                    named("Vendor", text("Example Maker")), named("Version", text("4.2.0"))});
+}
+
+}  // namespace
+
+const std::vector<LoadedKind>& loadedKinds() {
+    static const std::vector<LoadedKind> kinds{
+        {lease, leaseSetting, "Lease.dat", testsupport::leaseFields()},
+        {warranty, warrantySetting, "Warranty.dat", testsupport::warrantyFields()},
+    };
+    return kinds;
+}
+
+const std::vector<const char*>& loadedAssetProperties() {
+    static const std::vector<const char*> properties{"AssetNumber",          "PrimaryOwnerName",   "PrimaryOwnerPhone",
+                                                     "PrimaryOwnerPosition", "SystemLocation",     "ZOPMProfile",
+                                                     "PersonalizedLabel1",   "PersonalizedData1",  "PersonalizedLabel2",
+                                                     "PersonalizedData2",    "PersonalizedLabel5", "PersonalizedData5"};
+    return properties;
+}
+
+ModelRecord filledRecord(const LoadedKind& kind, const std::string& id, int number) {
+    ModelRecord record{id};
+    for (std::size_t field = 1; field < kind.fields.size(); ++field) {
+        record.push_back(valueOf(kind.fields[field].form, number));
+    }
+    return record;
+}
+
+std::vector<NamedValue> propertiesOf(const LoadedKind& kind, const ModelRecord& record) {
+    std::vector<NamedValue> properties;
+    for (std::size_t field = 1; field < kind.fields.size(); ++field) {
+        properties.push_back(named(kind.fields[field].property, cimValue(kind.fields[field].form, record[field])));
+    }
+    return properties;
+}
+
+void LoadClient::work(int round) {
+    for (const LoadedKind& kind : loadedKinds()) {
+        workOn(kind, round);
+    }
+    changeAsset(round);
+}
+
+void LoadClient::workOn(const LoadedKind& kind, int round) {
+    const std::string id = "client " + std::to_string(number) + " round " + std::to_string(round);
+    create(kind, id, number + 1, false);
+    create(kind, "shared " + std::to_string(round), number + 1, true);
+    read(kind, id);
+    modify(kind, id, 100 * (number + 1) + round);
+    enumerate(kind);
+    if (number == 0) {
+        move(kind, round);
+    } else {
+        associate(kind);
+    }
+    if (round % 2 == 1) {
+        remove(kind, id);
+    }
+}
+
+void LoadClient::expect(bool holds, const std::string& what, const cimhost::Status& status) {
+    if (!holds) {
+        problems.push_back(what + ": " + std::to_string(status.rc) + " " + status.message);
+    }
+}
+
+/** What is shared all clients create; one of them succeeds. */
+void LoadClient::create(const LoadedKind& kind, const std::string& id, int value, bool isShared) {
+    const ModelRecord record = filledRecord(kind, id, value);
+    const cimhost::Status status = gate.create(id, propertiesOf(kind, record), kind.className);
+    expect(status.ok() || (isShared && status.rc == CMPI_RC_ERR_ALREADY_EXISTS), "creating " + id, status);
+    if (status.ok()) {
+        told.records[kind.className][id] = record;
+    }
+}
+
+void LoadClient::read(const LoadedKind& kind, const std::string& id) {
+    const auto answer = gate.manager().getInstance({}, keyedPath(kind.className, id), {});
+    expect(answer.ok(), "getting " + id, answer.status);
+    expect(shows(kind, answer.value, told.records[kind.className][id]), "the values of " + id);
+}
+
+void LoadClient::modify(const LoadedKind& kind, const std::string& id, int value) {
+    const ModelRecord record = filledRecord(kind, id, value);
+    const auto status = gate.modify(keyedPath(kind.className, id), propertiesOf(kind, record));
+    expect(status.ok(), "modifying " + id, status);
+    told.records[kind.className][id] = record;
+}
+
+void LoadClient::remove(const LoadedKind& kind, const std::string& id) {
+    const auto status = gate.remove(id, kind.className);
+    expect(status.ok(), "deleting " + id, status);
+    told.records[kind.className].erase(id);
+}
+
+/** Everything that is this client's own is there, once, and as it was told. */
+void LoadClient::enumerate(const LoadedKind& kind) {
+    const auto answer = gate.manager().enumerateInstances({}, classPath(kind.className), {});
+    expect(answer.ok(), "enumerating", answer.status);
+    const Told::Records& own = told.records[kind.className];
+    std::set<std::string> seen;
+    for (const Instance& instance : answer.value) {
+        const std::string id = valueIn(instance, "InstanceID").value_or("(none)");
+        expect(seen.insert(id).second, id + " is there twice");
+        const auto found = own.find(id);
+        expect(found == own.end() || shows(kind, instance, found->second), "the listed values of " + id);
+    }
+    for (const auto& [id, record] : own) {
+        expect(seen.count(id) == 1, id + " is missing");
+    }
+}
+
+/** An up-call in each: the computers are another provider's. */
+void LoadClient::associate(const LoadedKind& kind) {
+    expectBelongings(kind, "alpha", {firstPlace});
+    expectComputer(kind, firstPlace, "alpha");
+}
+
+/** The second computer has a record, and has it no more. */
+void LoadClient::move(const LoadedKind& kind, int round) {
+    create(kind, secondPlace, round + 1, false);
+    expectBelongings(kind, "beta", {secondPlace});
+    expectComputer(kind, secondPlace, "beta");
+    remove(kind, secondPlace);
+    expectBelongings(kind, "beta", {});
+}
+
+void LoadClient::expectBelongings(const LoadedKind& kind, const char* computer,
+                                  const std::vector<std::string>& identifiers) {
+    const auto names = gate.manager().associatorNames({}, computerPath(computer), {kind.setting, {}, {}, {}});
+    expect(names.ok() && identifiersOf(names.value) == identifiers, std::string("what belongs to ") + computer,
+           names.status);
+    const auto references = gate.manager().referenceNames({}, computerPath(computer), {{}, kind.setting, {}, {}});
+    expect(references.ok() && references.value.size() == identifiers.size(), std::string("references of ") + computer,
+           references.status);
+}
+
+void LoadClient::expectComputer(const LoadedKind& kind, const char* place, const std::string& computer) {
+    const auto found = gate.manager().associators({}, keyedPath(kind.className, place), {kind.setting, {}, {}, {}}, {});
+    const bool isIt = found.value.size() == 1 && valueIn(found.value.front(), "Name") == computer;
+    expect(found.ok() && isIt, std::string("the computer of ") + place, found.status);
+}
+
+void LoadClient::changeAsset(int round) {
+    const auto& properties = loadedAssetProperties();
+    if (static_cast<std::size_t>(number) >= properties.size()) {
+        return;
+    }
+    const char* property = properties[static_cast<std::size_t>(number)];
+    const std::string value = "client " + std::to_string(number) + " round " + std::to_string(round);
+    const auto status = gate.modify(assetPath(), {named(property, text(value))});
+    expect(status.ok(), std::string("changing ") + property, status);
+    told.asset[property] = value;
+    const auto answer = gate.manager().getInstance({}, assetPath(), {});
+    expect(answer.ok() && valueIn(answer.value, property) == value, std::string("reading ") + property, answer.status);
+}
+
+}  // namespace gatetest
