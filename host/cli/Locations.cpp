@@ -34,7 +34,7 @@ fs::path programDirectory() {
 /** The entries of the variable, or nothing when it is not set or empty. */
 std::vector<std::string> listFrom(const char* variable) {
     std::vector<std::string> entries;
-    const char* value = std::getenv(variable);
+    const char* value = ::secure_getenv(variable);
     std::istringstream list(value == nullptr ? "" : value);
     for (std::string entry; std::getline(list, entry, ':');) {
         if (!entry.empty()) {

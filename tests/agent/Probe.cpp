@@ -8,6 +8,7 @@
 #include <unistd.h>
 
 #include <cstring>
+#include <utility>
 
 namespace agent_test {
 
@@ -39,8 +40,13 @@ std::vector<char*> pointersTo(std::vector<std::string>& texts) {
 }  // namespace
 
 ProbeResult runProbe(const std::string& configuration, std::vector<std::string> arguments) {
+    return runProgram(AGENT_PROBE, configuration, std::move(arguments));
+}
+
+ProbeResult runProgram(const std::string& program, const std::string& configuration,
+                       std::vector<std::string> arguments) {
     const TemporaryDirectory directory;
-    arguments.insert(arguments.begin(), AGENT_PROBE);
+    arguments.insert(arguments.begin(), program);
     std::vector<std::string> variables = environmentWith(configuration);
     posix_spawn_file_actions_t actions;
     ::posix_spawn_file_actions_init(&actions);
@@ -48,7 +54,7 @@ ProbeResult runProbe(const std::string& configuration, std::vector<std::string> 
     ::posix_spawn_file_actions_addopen(&actions, STDOUT_FILENO, directory.file("output").c_str(), flags, 0600);
     ::posix_spawn_file_actions_addopen(&actions, STDERR_FILENO, directory.file("errors").c_str(), flags, 0600);
     pid_t child = 0;
-    const int error = ::posix_spawn(&child, AGENT_PROBE, &actions, nullptr, pointersTo(arguments).data(),
+    const int error = ::posix_spawn(&child, program.c_str(), &actions, nullptr, pointersTo(arguments).data(),
                                     pointersTo(variables).data());
     ::posix_spawn_file_actions_destroy(&actions);
     EXPECT_EQ(error, 0);

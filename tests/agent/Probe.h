@@ -15,4 +15,8 @@ struct ProbeResult {
 /** Runs the probe under a configuration file; an empty path leaves the variable unset. */
 ProbeResult runProbe(const std::string& configuration, std::vector<std::string> arguments);
 
+/** The same with another program in the probe's place. */
+ProbeResult runProgram(const std::string& program, const std::string& configuration,
+                       std::vector<std::string> arguments);
+
 }  // namespace agent_test
