@@ -75,6 +75,17 @@ void addWrites(std::vector<Case>& cases, std::size_t size) {
     cases.push_back(writeCase<Row>("DeleteInstance", size, deleteInstance(middle)));
 }
 
+/** What a table costs that no machine has; of leases only, whose records are the longer ones. */
+void addLargest(std::vector<Case>& cases) {
+    using Row = LeaseRow;
+    const cimhost::ObjectPath middle = recordPath<Row>(instanceIdOf(largestSize / 2, largestSize));
+    cases.push_back(readCase<Row>("EnumInstances", largestSize, enumInstances(Row::className, largestSize)));
+    cases.push_back(readCase<Row>("EnumInstanceNames", largestSize, enumInstanceNames(Row::className, largestSize)));
+    cases.push_back(readCase<Row>("GetInstance.middle", largestSize, getInstance(middle)));
+    cases.push_back(writeCase<Row>("ModifyInstance", largestSize,
+                                   modifyInstance(middle, textValue(Row::modified.name, "Another Party Ltd"))));
+}
+
 template <class Row>
 void addRecords(std::vector<Case>& cases) {
     for (const std::size_t size : readSizes) {
@@ -119,6 +130,7 @@ Case associationCase(std::string operation, std::size_t computers, Request reque
 std::vector<Case> recordCases() {
     std::vector<Case> cases;
     addRecords<LeaseRow>(cases);
+    addLargest(cases);
     addRecords<WarrantyRow>(cases);
     return cases;
 }

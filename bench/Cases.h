@@ -36,6 +36,9 @@ struct Case {
 extern const std::vector<std::size_t> readSizes;
 extern const std::vector<std::size_t> writeSizes;
 
+/** The size of a table that shows whether all stays linear: only of leases, and of few requests. */
+constexpr std::size_t largestSize = 1000000;
+
 /** @name The cases */
 ///@{
 std::vector<Case> recordCases();

@@ -1,9 +1,11 @@
 #include "Cases.h"
 
 #include <benchmark/benchmark.h>
+#include <malloc.h>
 
 #include <exception>
 #include <iostream>
+#include <limits>
 
 namespace {
 
@@ -31,6 +33,8 @@ bool run() {
 }  // namespace
 
 int main(int argc, char** argv) {
+    // Memory that was used once stays in the process: else large answers are measured with the kernel's work for it.
+    mallopt(M_TRIM_THRESHOLD, std::numeric_limits<int>::max());
     benchmark::Initialize(&argc, argv);
     if (benchmark::ReportUnrecognizedArguments(argc, argv)) {
         return 1;

@@ -1,7 +1,9 @@
 #!/usr/bin/env python3
-"""Runs the benchmarks and puts their figures into docs/performance.md.
+"""Runs the benchmarks and puts their figures into docs/performance.md and its picture, docs/performance.svg.
 
 usage: bench/report.py BUILD_DIRECTORY [--min-time SECONDS] [--runs N] [--print]
+
+gnuplot draws the picture (Debian package gnuplot-nox).
 
 The figures stand between two marker lines of the document and replace what was there; with --print
 they go to standard output and the document stays as it is. Nothing is written unless every
@@ -14,8 +16,14 @@ import os
 import pathlib
 import subprocess
 import sys
+import tempfile
 
-DOCUMENT = pathlib.Path(__file__).resolve().parent.parent / "docs" / "performance.md"
+HERE = pathlib.Path(__file__).resolve().parent
+DOCUMENT = HERE.parent / "docs" / "performance.md"
+PICTURE = HERE.parent / "docs" / "performance.svg"
+INSTRUCTIONS = HERE / "instructions.json"
+PLOTTED = ("Load", "EnumInstances", "EnumInstanceNames", "GetInstance.middle", "ModifyInstance")
+PLOTTED_CLASS = "VELKO_Lease"
 BEGIN = "<!-- figures of bench/report.py begin -->\n"
 END = "<!-- figures of bench/report.py end -->\n"
 SIDES = ("provider", "floor")
@@ -100,6 +108,56 @@ def gate_table(cases):
     return table(["Request", "Class", "Records", "Alone", "Behind the gate", "Added", "Share"], rows)
 
 
+def instructions_table():
+    """The kept figures of bench/instructions.py."""
+    kept = json.loads(INSTRUCTIONS.read_text(encoding="utf-8"))
+    rows = []
+    for name, provider in kept.items():
+        operation, class_name, side, size = name.split("/")
+        if side == "provider":
+            floor = kept[f"{operation}/{class_name}/floor/{size}"]
+            rows.append([operation, class_name, f"{int(size):,}", f"{provider:,}", f"{floor:,}",
+                         f"{provider / floor:.2f}", f"{provider / int(size):,.0f}"])
+    return table(["Request", "Class", "Records", "Provider", "Floor", "Ratio", "A record"], rows)
+
+
+def growth_table(cases):
+    """Time a record with the largest table over that with 10,000 records."""
+    rows = []
+    for (operation, class_name), by_size in cases.items():
+        largest = max(by_size)
+        if largest > 100000:
+            per_record = {size: {side: by_size[size][side] / size for side in SIDES} for size in (10000, largest)}
+            growth = [f"{per_record[largest][side] / per_record[10000][side]:.2f}" for side in SIDES]
+            rows.append([operation, class_name, *(time_text(per_record[size]["provider"]) for size in per_record),
+                         *growth])
+    return table(["Request", "Class", "A record of 10,000", "of 1,000,000", "Growth", "Growth of the floor"], rows)
+
+
+def memory_table(results):
+    rows = []
+    for one in results[-1]["benchmarks"]:
+        operation, class_name, side, size = one["name"].split("/")[:4]
+        if (operation, side) == ("Load", "provider") and int(size) >= 10000:
+            memory, text = one["bytes_per_record"], one["text_per_record"]
+            rows.append([class_name, f"{int(size):,}", f"{text:.0f}", f"{memory:.0f}", f"{memory / text:.2f}"])
+    return table(["Class", "Records", "Bytes a record in the file", "in memory", "Ratio"], rows)
+
+
+def draw(cases):
+    """Draws the time a record of some requests, provider and floor, over the number of records."""
+    columns = [cases[(operation, PLOTTED_CLASS)] for operation in PLOTTED]
+    lines = []
+    for size in sorted({size for by_size in columns for size in by_size}):
+        cells = [f"{by_size[size][side] / size:.6g}" if size in by_size else "-"
+                 for by_size in columns for side in SIDES]
+        lines.append(" ".join([str(size), *cells]))
+    with tempfile.NamedTemporaryFile("w", suffix=".dat") as data:
+        data.write("\n".join(lines) + "\n")
+        data.flush()
+        subprocess.run(["gnuplot", "-e", f"data='{data.name}'; picture='{PICTURE}'", HERE / "plot.gp"], check=True)
+
+
 def processor():
     with open("/proc/cpuinfo", encoding="utf-8") as file:
         for line in file:
@@ -130,6 +188,12 @@ def figures(results):
         single_table(singles),
         "### The provider alone and behind the gate\n",
         gate_table(cases),
+        "### Time a record with 1,000,000 records\n",
+        growth_table(cases),
+        "### Memory that the loaded records take\n",
+        memory_table(results),
+        "### Instructions\n",
+        instructions_table(),
     ])
 
 
@@ -152,10 +216,12 @@ def main():
     parser.add_argument("--print", action="store_true", help="leave the document alone")
     arguments = parser.parse_args()
     program = arguments.build_directory / "bin" / "provider_benchmark"
-    text = figures([run(program, arguments.min_time) for _ in range(arguments.runs)])
+    results = [run(program, arguments.min_time) for _ in range(arguments.runs)]
+    text = figures(results)
     if arguments.print:
         print(text)
     else:
+        draw(measured(results))
         replace_figures(text)
 
 
