@@ -25,6 +25,7 @@ struct InstanceContent {
     Instance value{};
     std::shared_ptr<const ClassShape> shape{};  ///< null when the class is not known
     PropertyList accepted{};                    ///< the property filter; none accepts every property
+    bool filtersKeys = false;                   ///< whether the filter is one for keys, too
     std::size_t given = 0;                      ///< how many properties, all at the front, the broker put in itself
 };
 

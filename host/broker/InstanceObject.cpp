@@ -21,10 +21,10 @@ bool isKey(const InstanceContent& instance, const std::string& name) {
     return shape != nullptr ? shape->isKey : findNamed(instance.value.path.keys, name) != nullptr;
 }
 
-/** Whether the property filter lets the property through. Keys always pass: without them an instance is nameless. */
+/** Whether the property filter lets the property through. Keys usually pass: without them an instance is nameless. */
 bool accepts(const InstanceContent& instance, const std::string& name) {
     const PropertyList& list = instance.accepted;
-    return !list || isKey(instance, name) ||
+    return !list || (!instance.filtersKeys && isKey(instance, name)) ||
            std::any_of(list->begin(), list->end(), [&](const std::string& each) { return sameName(each, name); });
 }
 
@@ -118,19 +118,29 @@ CMPIStatus setObjectPath(CMPIInstance* instance, const CMPIObjectPath* path) {
     });
 }
 
-/** The list of keys is ignored, as the standard allows: the broker knows them. */
-CMPIStatus setPropertyFilter(CMPIInstance* instance, const char** properties, const char**) {
+CMPIStatus filter(CMPIInstance* instance, const char** properties, bool filtersKeys) {
     return guarded([&] {
         InstanceContent& target = content(instance);
         target.accepted = propertyListFrom(properties);
+        target.filtersKeys = filtersKeys;
         auto& values = target.value.properties;
-        values.erase(std::remove_if(values.begin(), values.end(),
-                                    [&](const NamedValue& each) { return !accepts(target, each.name); }),
-                     values.end());
+        const auto isHidden = [&](const NamedValue& each) { return !accepts(target, each.name); };
+        const auto given = values.begin() + static_cast<std::ptrdiff_t>(target.given);
+        target.given -= static_cast<std::size_t>(std::count_if(values.begin(), given, isHidden));
+        values.erase(std::remove_if(values.begin(), values.end(), isHidden), values.end());
     });
 }
 
+/** The list of keys is ignored, as the standard allows: the broker knows them. */
+CMPIStatus setPropertyFilter(CMPIInstance* instance, const char** properties, const char**) {
+    return filter(instance, properties, false);
+}
+
 }  // namespace
+
+CMPIStatus filterWithKeys(CMPIInstance* instance, const char** properties, const char**) {
+    return filter(instance, properties, true);
+}
 
 const CMPIInstanceFT instanceTable{tableVersion,
                                    releaseObject<CMPIInstance>,

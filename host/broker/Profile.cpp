@@ -34,6 +34,12 @@ Profile sfcbProfile() {
     profile.trimsBlanks = true;
     profile.trimsOutsideAscii = true;
     profile.startsProviderPerClass = true;
+    profile.factory = FactoryChoice::genericFirst;
+    profile.typing = Typing::numbersPass;
+    profile.answerLimit = 10'000'000;
+    profile.startsAllInterfaces = true;
+    profile.startsAtOnce = true;
+    profile.filterHidesKeys = true;
     return profile;
 }
 
@@ -50,6 +56,10 @@ Profile openPegasusProfile() {
     profile.namesAllProperties = true;
     profile.refusesEmptyGet = true;
     profile.emptiesReferences = true;
+    profile.factory = FactoryChoice::onlyOne;
+    profile.typing = Typing::byClass;
+    profile.loadsLazily = true;
+    profile.staysIfAllAsk = true;
     profile.trimsBlanks = true;
     return profile;
 }
@@ -98,6 +108,9 @@ std::optional<Manager> managerNamed(std::string_view name) {
 void applyGaps(const Profile& profile, FunctionTables& tables) {
     tables.broker.brokerVersion = profile.brokerVersion;
     tables.encapsulation.ftVersion = profile.encapsulationVersion;
+    if (profile.filterHidesKeys) {
+        tables.instance.setPropertyFilter = filterWithKeys;
+    }
     if (profile.gaps != BrokerGaps::someFunctions) {
         return;
     }

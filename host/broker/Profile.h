@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstddef>
 #include <optional>
 #include <string_view>
 
@@ -42,6 +43,20 @@ enum class CreationResult {
     pathOnly   ///< instances are refused
 };
 
+/** Which factory is called, "Name_Create_..." or "_Generic_Create_...". */
+enum class FactoryChoice {
+    namedFirst,
+    genericFirst,
+    onlyOne  ///< a library that has both cannot be used
+};
+
+/** What becomes of a value whose type is not that of the property. */
+enum class Typing {
+    asSent,
+    numbersPass,  ///< numbers reach the provider as they are; text for a number ends the process
+    byClass       ///< numbers that fit are converted; all else, and datetimes that do not exist, are refused
+};
+
 /** What providers and clients meet under an object manager, where managers differ. */
 struct Profile {
     Manager manager;
@@ -53,6 +68,14 @@ struct Profile {
     Escape escape;
     CreationResult created;
     CreationKey creationKey;
+    FactoryChoice factory;
+    Typing typing;
+    std::size_t answerLimit;      ///< of the bytes that an answer has in XML; 0: none
+    bool loadsLazily;             ///< functions of a library are looked for when they are first called
+    bool startsAllInterfaces;     ///< for a class, its instance and its association interface start together
+    bool startsAtOnce;            ///< factories run on several threads at a time
+    bool filterHidesKeys;         ///< a property filter shows what it lists, keys or not
+    bool staysIfAllAsk;           ///< an idle library stays if all its interfaces ask for it, not if one does
     bool completesInstances;      ///< all properties of the class are there at creation and modification, unset: null
     bool hollowTexts;             ///< unset texts, principal and role are string objects without characters
     bool namesAllProperties;      ///< the property list is never null, and that of a modification has the keys

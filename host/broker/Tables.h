@@ -24,4 +24,7 @@ extern const CMPIContextFT contextTable;
 extern const CMPIResultFT resultTable;
 extern const CMPIErrorFT errorTable;
 
+/** Another setPropertyFilter of instances, under which keys that are not listed are hidden, too. */
+CMPIStatus filterWithKeys(CMPIInstance* instance, const char** properties, const char** keys);
+
 }  // namespace cimhost

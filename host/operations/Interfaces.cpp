@@ -13,15 +13,20 @@ using NamedFactory = Interface*(const CMPIBroker*, const CMPIContext*, CMPIStatu
 template <class Interface>
 using GenericFactory = Interface*(const CMPIBroker*, const CMPIContext*, const char*, CMPIStatus*);
 
-/** Calls whichever factory the library has. */
+/** Calls the factory that the broker's manager would. */
 template <class Interface>
-Interface* callFactory(const LoadedLibrary& library, const std::string& provider, const CMPIBroker* broker,
-                       const CMPIContext* context, CMPIStatus* rc) {
+Interface* callFactory(const LoadedLibrary& library, const std::string& provider, FactoryChoice choice,
+                       const CMPIBroker* broker, const CMPIContext* context, CMPIStatus* rc) {
     const std::string suffix = std::string("_Create_") + nameOf(InterfaceTraits<Interface>::kind) + "MI";
-    if (auto* named = library.function<NamedFactory<Interface>>(provider + suffix)) {
+    auto* named = library.function<NamedFactory<Interface>>(provider + suffix);
+    auto* generic = library.function<GenericFactory<Interface>>("_Generic" + suffix);
+    if (named != nullptr && generic != nullptr && choice == FactoryChoice::onlyOne) {
+        throw LibraryError(library.file().string() + " has both " + provider + suffix + " and _Generic" + suffix);
+    }
+    if (named != nullptr && (generic == nullptr || choice != FactoryChoice::genericFirst)) {
         return named(broker, context, rc);
     }
-    if (auto* generic = library.function<GenericFactory<Interface>>("_Generic" + suffix)) {
+    if (generic != nullptr) {
         return generic(broker, context, provider.c_str(), rc);
     }
     throw LibraryError(library.file().string() + " has neither " + provider + suffix + " nor _Generic" + suffix);
@@ -46,7 +51,7 @@ Interface* createInterface(const LoadedLibrary& library, const std::string& prov
     Interface* interface = nullptr;
     const ProviderCall call = callProvider([&] {
         CMPIStatus status{CMPI_RC_OK, nullptr};
-        interface = callFactory<Interface>(library, provider, handle, context, &status);
+        interface = callFactory<Interface>(library, provider, broker.profile().factory, handle, context, &status);
         return status;
     });
     if (!call.status.ok()) {

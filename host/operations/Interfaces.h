@@ -32,7 +32,8 @@ struct InterfaceTraits<CMPIAssociationMI> {
 
 /**
  * Calls the factory of a provider: <name>_Create_<kind>MI or, where the library has no such function,
- * _Generic_Create_<kind>MI. Objects that the factory makes end with the call.
+ * _Generic_Create_<kind>MI; a manager that is played may choose otherwise where there are both. Objects that the
+ * factory makes end with the call.
  * @param handle the broker as the provider is to see it: usually broker.handle()
  * @return never null, and with a function table; belongs to the provider
  * @throws LibraryError when there is no factory, or it fails, throws or answers nothing usable

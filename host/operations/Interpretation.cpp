@@ -42,6 +42,48 @@ bool returnedObject(const RawAnswer& answer) {
     });
 }
 
+/** What a value has beside its text in XML: elements, attributes, a type. */
+constexpr std::size_t markup = 75;
+
+std::size_t xmlSize(const std::vector<NamedValue>& values);
+
+std::size_t xmlSize(const ObjectPath& path) {
+    return markup + path.nameSpace.size() + path.className.size() + xmlSize(path.keys);
+}
+
+std::size_t xmlSize(const Scalar& value) {
+    constexpr std::size_t number = 10;
+    if (const auto* text = std::get_if<std::string>(&value)) {
+        return text->size();
+    }
+    const auto* path = std::get_if<std::shared_ptr<const ObjectPath>>(&value);
+    return path == nullptr || *path == nullptr ? number : xmlSize(**path);
+}
+
+std::size_t xmlSize(const std::vector<NamedValue>& values) {
+    std::size_t size = 0;
+    for (const NamedValue& each : values) {
+        size += markup + each.name.size();
+        for (const Scalar& element : each.value.elements) {
+            size += xmlSize(element);
+        }
+    }
+    return size;
+}
+
+/** About how long an answer is in XML. */
+std::size_t xmlSize(const ResultEvents& events) {
+    std::size_t size = 0;
+    for (const ResultEvent& event : events) {
+        if (const auto* path = std::get_if<ObjectPath>(&event)) {
+            size += xmlSize(*path);
+        } else if (const auto* instance = std::get_if<Instance>(&event)) {
+            size += xmlSize(instance->path) + xmlSize(instance->properties);
+        }
+    }
+    return size;
+}
+
 bool isReferenceOperation(Operation operation) {
     return operation == Operation::references || operation == Operation::referenceNames;
 }
@@ -76,6 +118,9 @@ Status statusOf(const RawAnswer& answer, Operation operation) {
     const Profile& profile = profileOf(answer.manager);
     if (answer.threw && profile.escape == Escape::unknownError) {
         return {CMPI_RC_ERR_FAILED, "Unknown error."};
+    }
+    if (profile.answerLimit != 0 && xmlSize(answer.events) > profile.answerLimit) {
+        return {CMPI_RC_ERR_FAILED, "The answer is longer than the manager's limit."};
     }
     const bool isEmptied =
         profile.emptiesReferences && isReferenceOperation(operation) && answer.status.rc == CMPI_RC_ERR_NOT_SUPPORTED;

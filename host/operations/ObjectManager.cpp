@@ -6,6 +6,7 @@
 #include "broker/NamedValues.h"
 #include "operations/Interpretation.h"
 #include "operations/RequestRunner.h"
+#include "operations/Typing.h"
 #include "schema/Names.h"
 
 namespace cimhost {
@@ -88,21 +89,40 @@ ProviderAddress ObjectManager::addressOf(const ServedClass& served) const {
     return address;
 }
 
+template <class Interface>
+Interface* ObjectManager::started(const ServedClass& served) {
+    const ProviderAddress address = addressOf(served);
+    if (itsBroker.profile().startsAllInterfaces) {
+        if (providers.find(served.nameSpace, served.className, InterfaceKind::instance) != nullptr) {
+            pool.get<CMPIInstanceMI>(address);
+        }
+        if (providers.find(served.nameSpace, served.className, InterfaceKind::association) != nullptr) {
+            pool.get<CMPIAssociationMI>(address);
+        }
+    }
+    return pool.get<Interface>(address);
+}
+
 Answer<std::vector<RawAnswer>> ObjectManager::run(Request request) {
     if (!providers.knowsNameSpace(request.path.nameSpace)) {
         return {{CMPI_RC_ERR_INVALID_NAMESPACE, "There is no namespace " + request.path.nameSpace + "."}, {}};
     }
     completeContext(request);
-    return isAssociationOperation(request.operation) ? runForAssociation(std::move(request)) : runForInstance(request);
+    return isAssociationOperation(request.operation) ? runForAssociation(std::move(request))
+                                                     : runForInstance(std::move(request));
 }
 
-Answer<std::vector<RawAnswer>> ObjectManager::runForInstance(const Request& request) {
+Answer<std::vector<RawAnswer>> ObjectManager::runForInstance(Request request) {
     const ObjectPath& path = request.path;
     const ServedClass* served = providers.find(path.nameSpace, path.className, InterfaceKind::instance);
     if (served == nullptr) {
         return {noProvider(request, path.className), {}};
     }
-    return {{}, {runRequest(itsBroker, pool.get<CMPIInstanceMI>(addressOf(*served)), request)}};
+    const Status refusal = takeTypes(request, itsBroker);
+    if (!refusal.ok()) {
+        return {refusal, {}};
+    }
+    return {{}, {runRequest(itsBroker, started<CMPIInstanceMI>(*served), request)}};
 }
 
 Answer<std::vector<RawAnswer>> ObjectManager::runForAssociation(Request request) {
@@ -122,7 +142,7 @@ Answer<std::vector<RawAnswer>> ObjectManager::runForAssociation(Request request)
             const bool isAsked = asked && sameName(served->className, *asked);
             request.filter.*associationClass = isAsked ? *asked : served->className;
         }
-        answers.push_back(runRequest(itsBroker, pool.get<CMPIAssociationMI>(addressOf(*served)), request));
+        answers.push_back(runRequest(itsBroker, started<CMPIAssociationMI>(*served), request));
     }
     return {{}, std::move(answers)};
 }

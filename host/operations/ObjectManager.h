@@ -52,6 +52,12 @@ public:
      */
     Answer<std::vector<RawAnswer>> run(Request request);
 
+    /**
+     * What happens when nobody has asked for anything for a while: providers are cleaned up, and libraries that do not
+     * ask to stay are unloaded, to be loaded again when they are needed. Not while a request is inside.
+     */
+    void idle() { pool.idle(); }
+
     const ProviderRegistry& registry() const { return providers; }
     Broker& broker() { return itsBroker; }
 
@@ -93,12 +99,16 @@ public:
     ///@}
 
 private:
-    Answer<std::vector<RawAnswer>> runForInstance(const Request& request);
+    Answer<std::vector<RawAnswer>> runForInstance(Request request);
     Answer<std::vector<RawAnswer>> runForAssociation(Request request);
     std::vector<const ServedClass*> associationsFor(const std::string& nameSpace,
                                                     const std::optional<std::string>& className) const;
     void completeContext(Request& request) const;
     ProviderAddress addressOf(const ServedClass& served) const;
+
+    /** The interface of a class's provider, with the other one where a manager starts both. */
+    template <class Interface>
+    Interface* started(const ServedClass& served);
 
     ContextEntries baseContext;
     ProviderRegistry providers;

@@ -1,5 +1,6 @@
 #include "operations/ProviderPool.h"
 
+#include <iterator>
 #include <mutex>
 #include <tuple>
 #include <type_traits>
@@ -9,6 +10,11 @@
 
 namespace cimhost {
 namespace {
+
+/** Whether a cleanup answers that the library has to stay. */
+bool asksToStay(int answer) {
+    return answer == CMPI_RC_DO_NOT_UNLOAD || answer == CMPI_RC_NEVER_UNLOAD;
+}
 
 /** Marks a provider as starting, for as long as it lives. */
 class Starting {
@@ -48,13 +54,45 @@ Interface*& ProviderPool::member(Provider& provider) {
     }
 }
 
+bool ProviderPool::staysWhenIdle(const LoadedLibrary& library) {
+    std::size_t interfaces = 0;
+    std::size_t asking = 0;
+    const auto ask = [&](auto* interface) {
+        if (interface != nullptr) {
+            ++interfaces;
+            asking += asksToStay(cleanUp(interface, broker, false)) ? 1 : 0;
+        }
+    };
+    for (auto& [address, provider] : providers) {
+        if (provider.library == &library) {
+            ask(provider.instance);
+            ask(provider.association);
+        }
+    }
+    return broker.profile().staysIfAllAsk ? asking == interfaces : asking > 0;
+}
+
+void ProviderPool::idle() {
+    const std::lock_guard<ChainMutex> lock(mutex);
+    for (auto library = libraries.begin(); library != libraries.end();) {
+        const LoadedLibrary* loaded = library->second.get();
+        if (loaded == nullptr || staysWhenIdle(*loaded)) {
+            ++library;
+            continue;
+        }
+        for (auto provider = providers.begin(); provider != providers.end();) {
+            provider = provider->second.library == loaded ? providers.erase(provider) : std::next(provider);
+        }
+        library = libraries.erase(library);
+    }
+}
+
 template <class Interface>
 void ProviderPool::end(Provider& provider, Interface* interface) {
     if (interface == nullptr) {
         return;
     }
-    const int answer = cleanUp(interface, broker, true);
-    if (answer == CMPI_RC_DO_NOT_UNLOAD || answer == CMPI_RC_NEVER_UNLOAD) {
+    if (asksToStay(cleanUp(interface, broker, true))) {
         provider.library->keep();
     }
 }
@@ -62,23 +100,33 @@ void ProviderPool::end(Provider& provider, Interface* interface) {
 LoadedLibrary& ProviderPool::library(const std::string& location) {
     auto& entry = libraries[location];
     if (!entry) {
-        entry = std::make_unique<LoadedLibrary>(findLibrary(location, options), options.flags);
+        const bool isLazy = broker.profile().loadsLazily;
+        const int flags = isLazy ? (options.flags & ~RTLD_NOW) | RTLD_LAZY : options.flags;
+        entry = std::make_unique<LoadedLibrary>(findLibrary(location, options), flags);
     }
     return *entry;
 }
 
+ProviderPool::Provider& ProviderPool::provider(const ProviderAddress& address) {
+    const std::lock_guard<ChainMutex> lock(mutex);
+    Provider& found = providers[address];
+    if (found.library == nullptr) {
+        found.library = &library(address.location);
+    }
+    return found;
+}
+
 template <class Interface>
 Interface* ProviderPool::get(const ProviderAddress& address) {
-    const std::lock_guard<ChainMutex> lock(mutex);
-    Provider& provider = providers[address];
-    Interface*& interface = member<Interface>(provider);
+    Provider& found = provider(address);
+    const std::lock_guard<ChainMutex> lock(broker.profile().startsAtOnce ? found.mutex : mutex);
+    Interface*& interface = member<Interface>(found);
     if (interface == nullptr) {
-        if (provider.isStarting) {
+        if (found.isStarting) {
             throw LibraryError("Provider " + address.provider + " needs itself to start.");
         }
-        const Starting starting(provider.isStarting);
-        provider.library = &library(address.location);
-        interface = createInterface<Interface>(*provider.library, address.provider, broker, broker.handle());
+        const Starting starting(found.isStarting);
+        interface = createInterface<Interface>(*found.library, address.provider, broker, broker.handle());
     }
     return interface;
 }

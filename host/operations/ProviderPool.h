@@ -27,6 +27,9 @@ public:
     template <class Interface>
     Interface* get(const ProviderAddress& address);
 
+    /** Cleans up all providers and unloads the libraries that do not ask to stay. Not while a request is inside. */
+    void idle();
+
 private:
     /** A provider in its library, with the interfaces made so far. */
     struct Provider {
@@ -34,6 +37,7 @@ private:
         CMPIInstanceMI* instance = nullptr;
         CMPIAssociationMI* association = nullptr;
         bool isStarting = false;  ///< a factory is running
+        ChainMutex mutex{};       ///< held while a factory runs, where factories of other classes may run meanwhile
     };
 
     /** Some order of addresses. */
@@ -47,7 +51,11 @@ private:
     template <class Interface>
     void end(Provider& provider, Interface* interface);
 
+    /** Cleans up the providers of a library; whether it stays. */
+    bool staysWhenIdle(const LoadedLibrary& library);
+
     LoadedLibrary& library(const std::string& location);
+    Provider& provider(const ProviderAddress& address);
 
     Broker& broker;
     LibraryOptions options;

@@ -23,6 +23,14 @@ CMPIInstanceMIFT table{CMPIVersion200, CMPIVersion200, "instanceOther", cleanup,
                        nullptr,        nullptr,        nullptr,         nullptr, nullptr};
 CMPIInstanceMI interface { nullptr, &table };
 
+CMPIStatus cleanupAssociation(CMPIAssociationMI*, const CMPIContext*, CMPIBoolean) {
+    return kit::ok;
+}
+
+CMPIAssociationMIFT associationTable{
+    CMPIVersion200, CMPIVersion200, "associationOther", cleanupAssociation, nullptr, nullptr, nullptr, nullptr};
+CMPIAssociationMI association{nullptr, &associationTable};
+
 int refusals = 2;
 
 }  // namespace
@@ -60,4 +68,10 @@ KIT_EXPORT CMPIInstanceMI* Selfish_Create_InstanceMI(const CMPIBroker* itsBroker
     const CMPIObjectPath* own = itsBroker->eft->newObjectPath(itsBroker, "root/cimv2", "Selfish_Thing", nullptr);
     itsBroker->bft->enumerateInstances(itsBroker, context, own, nullptr, status);
     return status->rc == CMPI_RC_OK ? &interface : nullptr;
+}
+
+/** Its association interface does not ask to stay, as its instance interface does. */
+KIT_EXPORT CMPIAssociationMI* Half_Create_AssociationMI(const CMPIBroker* itsBroker, const CMPIContext*, CMPIStatus*) {
+    kit::log(itsBroker, "half factory");
+    return &association;
 }

@@ -1,0 +1,109 @@
+#include <dlfcn.h>
+
+#include <algorithm>
+#include <thread>
+
+#include "OperationsFixture.h"
+#include "support/Managers.h"
+
+// How object managers load libraries and start providers, where they differ.
+
+namespace {
+
+using cimhost::LibraryError;
+using cimhost::Manager;
+using testing::HasSubstr;
+using testing::IsEmpty;
+
+bool isLoaded(const char* library) {
+    void* handle = dlopen((std::string(TEST_PROVIDERS) + "/" + library).c_str(), RTLD_NOW | RTLD_NOLOAD);
+    if (handle != nullptr) {
+        dlclose(handle);
+    }
+    return handle != nullptr;
+}
+
+class ManagerLoadingTest : public OperationsTest {
+protected:
+    ManagerLoadingTest() {
+        add("Refusing_Thing", "Refusing", "OtherProvider", true, false);
+        add("Lazy_Thing", "Lazy", "LazyProvider", true, false);
+        add("Other_Both", "Anything", "OtherProvider", true, true);
+        add("Together_One", "Together", "TogetherProvider", true, false);
+        add("Together_Two", "Together", "TogetherProvider", true, false);
+    }
+
+    /** What comes of an enumeration under a manager that starts anew: the text of a LibraryError, or nothing. */
+    std::string errorOf(Manager which, const char* className) {
+        started.reset();
+        options.manager = which;
+        try {
+            EXPECT_TRUE(manager().enumerateInstances({}, classPath(className), {}).ok());
+            return {};
+        } catch (const LibraryError& error) {
+            return error.what();
+        }
+    }
+};
+
+TEST_F(ManagerLoadingTest, OfTwoFactoriesOneIsCalledOrNone) {
+    EXPECT_THAT(errorOf(Manager::standard, "Refusing_Thing"), HasSubstr("no licence")) << "the one with the name";
+    EXPECT_THAT(errorOf(Manager::sfcb, "Refusing_Thing"), IsEmpty()) << "the generic one";
+    EXPECT_THAT(errorOf(Manager::openPegasus, "Refusing_Thing"),
+                HasSubstr("has both Refusing_Create_InstanceMI and _Generic_Create_InstanceMI"));
+    EXPECT_THAT(errorOf(Manager::openPegasus, "Other_Thing"), IsEmpty()) << "there is only the generic one";
+}
+
+TEST_F(ManagerLoadingTest, AFunctionThatIsMissingIsMissedAtOnceOrWhenItIsCalled) {
+    for (const Manager each : {Manager::standard, Manager::sfcb}) {
+        EXPECT_THAT(errorOf(each, "Lazy_Thing"), HasSubstr("functionThatNobodyHas"));
+    }
+    EXPECT_THAT(errorOf(Manager::openPegasus, "Lazy_Thing"), IsEmpty());
+}
+
+TEST_F(ManagerLoadingTest, EveryTypeThatIsRegisteredHasToBeThereAtOnceOrWhenItIsAskedFor) {
+    for (const Manager each : {Manager::standard, Manager::openPegasus}) {
+        EXPECT_THAT(errorOf(each, "Other_Both"), IsEmpty());
+    }
+    EXPECT_THAT(errorOf(Manager::sfcb, "Other_Both"), HasSubstr("neither Anything_Create_AssociationMI"));
+}
+
+TEST_F(ManagerLoadingTest, WhatIsIdleIsUnloadedAndLoadedAgainUnlessItAsksToStay) {
+    for (const Manager each : testsupport::everyManager) {
+        EXPECT_THAT(errorOf(each, "Sample_Thing"), IsEmpty());
+        EXPECT_TRUE(manager().enumerateInstances({}, classPath("Other_Thing"), {}).ok());
+        log.clear();
+        manager().idle();
+        EXPECT_THAT(log, testing::ElementsAre("instance cleanup"));
+        EXPECT_FALSE(isLoaded("libSampleProvider.so"));
+        EXPECT_TRUE(isLoaded("libOtherProvider.so")) << "its cleanup asks to stay";
+        EXPECT_TRUE(manager().enumerateInstances({}, classPath("Sample_Thing"), {}).ok());
+        EXPECT_THAT(log, testing::ElementsAre("instance cleanup", "instance factory"));
+    }
+}
+
+TEST_F(ManagerLoadingTest, AnIdleLibraryStaysIfOneInterfaceAsksOrIfAllDo) {
+    add("Half_Thing", "Half", "OtherProvider", true, true);
+    for (const auto& [each, starts] :
+         {std::pair(Manager::standard, 1U), std::pair(Manager::sfcb, 1U), std::pair(Manager::openPegasus, 2U)}) {
+        EXPECT_THAT(errorOf(each, "Half_Thing"), IsEmpty());
+        log.clear();
+        const auto associate = [this] {
+            manager().associatorNames({}, classPath("Half_Thing"), {"Half_Thing", {}, {}, {}});
+        };
+        associate();
+        manager().idle();
+        associate();
+        EXPECT_EQ(std::count(log.begin(), log.end(), "half factory"), starts);
+    }
+}
+
+TEST_F(ManagerLoadingTest, FactoriesOfTwoClassesMayRunAtATime) {
+    options.manager = Manager::sfcb;
+    manager();
+    std::thread other([this] { EXPECT_TRUE(manager().enumerateInstances({}, classPath("Together_Two"), {}).ok()); });
+    EXPECT_TRUE(manager().enumerateInstances({}, classPath("Together_One"), {}).ok());
+    other.join();
+}
+
+}  // namespace
