@@ -1,5 +1,5 @@
-// Uses the provider for long, and fails when the process holds on to more and more. To be exact it wants the environment
-// variable GLIBC_TUNABLES=glibc.malloc.tcache_count=0: the C library counts what its caches keep as in use.
+// Uses the provider for long, and fails when the process holds on to more and more. To be exact it wants the
+// environment variable GLIBC_TUNABLES=glibc.malloc.tcache_count=0: the C library counts what its caches keep as in use.
 
 #include "Soak.h"
 

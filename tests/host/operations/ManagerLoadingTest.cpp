@@ -86,8 +86,8 @@ TEST_F(ManagerLoadingTest, AnIdleLibraryStaysIfOneInterfaceAsksOrIfAllDo) {
     add("Half_Thing", "Half", "OtherProvider", true, true);
     for (const auto& [each, starts] :
          {std::pair(Manager::standard, 1U), std::pair(Manager::sfcb, 1U), std::pair(Manager::openPegasus, 2U)}) {
-        EXPECT_THAT(errorOf(each, "Half_Thing"), IsEmpty());
         log.clear();
+        EXPECT_THAT(errorOf(each, "Half_Thing"), IsEmpty());
         const auto associate = [this] {
             manager().associatorNames({}, classPath("Half_Thing"), {"Half_Thing", {}, {}, {}});
         };
