@@ -23,6 +23,10 @@ bool isChained(const Property& property) {
     return sameName(std::string_view(property.name).substr(0, chainedProperties.size()), chainedProperties);
 }
 
+bool isAmong(const Property& property, const Values& values) {
+    return std::any_of(values.begin(), values.end(), [&](const auto& value) { return value.first == &property; });
+}
+
 /** What is stored where the provider shows a text. */
 std::string stored(const Property& property, const std::string& shown) {
     return isChained(property) && shown == shownForEmpty ? std::string() : shown;
@@ -111,8 +115,7 @@ Values changesTo(const CMPIInstance* current, const Values& given, bool areListe
 Values changed(const Class& owner, const CMPIInstance* current, const Values& changes) {
     Values values = changes;
     for (const Property& property : owner) {
-        const auto isIt = [&](const auto& change) { return change.first == &property; };
-        if (!isChained(property) || std::any_of(changes.begin(), changes.end(), isIt)) {
+        if (!isChained(property) || isAmong(property, changes)) {
             continue;
         }
         const auto text = propertyOf(current, property);
@@ -125,17 +128,45 @@ Values changed(const Class& owner, const CMPIInstance* current, const Values& ch
     return values;
 }
 
-Values undoing(const Values& changes, const CMPIInstance* current) {
+Values undoing(const Class& owner, const DataFile& file, const Values& changes, const CMPIInstance* current) {
     Values values;
-    for (const auto& change : changes) {
-        const Property& property = *change.first;
-        values.emplace_back(&property, stored(property, propertyOf(current, property).value_or(noDate)));
+    for (const Property& property : owner) {
+        const auto text = propertyOf(current, property);
+        if (isAmong(property, changes) || (!file.keepsRecords() && text && !property.isKey)) {
+            values.emplace_back(&property, stored(property, text.value_or(noDate)));
+        }
     }
     return values;
 }
 
-void requireChanged(const DataFile& file, const CMPIInstance* before, const CMPIInstance* after,
+bool addsValues(const Values& changes) {
+    return std::all_of(changes.begin(), changes.end(), [](const auto& change) {
+        return !change.second.empty() && !(change.first->type == CMPI_dateTime && change.second == noDate);
+    });
+}
+
+namespace {
+
+/** Fails if a value that was not to be changed is not there any more. */
+void requireNothingLost(const Class& owner, const CMPIInstance* before, const CMPIInstance* after,
+                        const Values& changes) {
+    for (const Property& property : owner) {
+        const auto textOf = [&](const CMPIInstance* instance) {
+            return stored(property, propertyOf(instance, property).value_or(std::string()));
+        };
+        if (!isAmong(property, changes) && textOf(after).empty() && !textOf(before).empty()) {
+            fail(CMPI_RC_ERR_FAILED, std::string(property.name) + " was lost: the data file could not be read.");
+        }
+    }
+}
+
+}  // namespace
+
+void requireChanged(const Class& owner, const DataFile& file, const CMPIInstance* before, const CMPIInstance* after,
                     const Values& changes) {
+    if (addsValues(changes)) {  // one that is taken away may have stood behind two properties
+        requireNothingLost(owner, before, after, changes);
+    }
     for (const auto& [property, text] : changes) {
         const auto now = propertyOf(after, *property);
         const bool isDate = property->type == CMPI_dateTime;

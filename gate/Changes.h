@@ -26,10 +26,17 @@ Values changesTo(const CMPIInstance* current, const Values& given, bool areListe
  */
 Values changed(const Class& owner, const CMPIInstance* current, const Values& changes);
 
-/** What takes changes back: the values that the current instance, read before them, has in their place. */
-Values undoing(const Values& changes, const CMPIInstance* current);
+/**
+ * What takes changes back: the values that the current instance, read before them, has in their place. Of a property
+ * file also all others, which a change that could not read it has emptied.
+ */
+Values undoing(const Class& owner, const DataFile& file, const Values& changes, const CMPIInstance* current);
 
-/** Fails unless the instance, read again after a change, has the changes. */
-void requireChanged(const DataFile& file, const CMPIInstance* before, const CMPIInstance* after, const Values& changes);
+/** Whether a value is there after the changes that was not there before, rather than values being taken away. */
+bool addsValues(const Values& changes);
+
+/** Fails unless the instance, read again after a change, has the changes, and has lost nothing else. */
+void requireChanged(const Class& owner, const DataFile& file, const CMPIInstance* before, const CMPIInstance* after,
+                    const Values& changes);
 
 }  // namespace gate

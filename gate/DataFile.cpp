@@ -115,17 +115,19 @@ void DataFile::requireWritable(std::size_t growth) const {
     }
 }
 
+std::string DataFile::text() const {
+    std::ifstream stream(pathOf(*this), std::ios::binary);
+    return {std::istreambuf_iterator<char>(stream), std::istreambuf_iterator<char>()};
+}
+
 std::size_t DataFile::recordsOf(const std::string& identifier) const {
     if (!keepsRecords()) {
         return 0;
     }
-    const std::string path = pathOf(*this);
-    std::ifstream stream(path, std::ios::binary);
-    const std::vector<std::string> lines =
-        linesOf({std::istreambuf_iterator<char>(stream), std::istreambuf_iterator<char>()});
+    const std::vector<std::string> lines = linesOf(text());
     const std::size_t whole = 1 + declaredIn(lines) * linesPerRecord;
     if (lines.empty() || lines.size() < whole || (whole > 1 && lines.back().empty())) {
-        failFor(path, "it does not hold all records; the disk may be full");
+        failFor(pathOf(*this), "it does not hold all records; the disk may be full");
     }
     std::string stored = identifier;
     std::replace(stored.begin(), stored.end(), ' ', '_');

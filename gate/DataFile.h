@@ -33,6 +33,9 @@ struct DataFile {
      */
     std::size_t recordsOf(const std::string& identifier) const;
 
+    /** All that the file holds; nothing where it cannot be read. */
+    std::string text() const;
+
     /** recordsOf(), but none for a file that is not whole. */
     std::optional<std::size_t> recordsIfWhole(const std::string& identifier) const;
 };

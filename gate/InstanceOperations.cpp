@@ -94,9 +94,13 @@ void orUndone(const Target& target, Change change, Undo undo) {
 
 /** Makes the changes; fails unless they are stored. */
 void apply(const Provider& provider, const Target& target, const CMPIInstance* current, const Values& changes) {
+    const std::string before = target.file.text();
     provider.modify(target.path, OwnInstance(changed(target.owner, current, changes)));
-    requireChanged(target.file, current, existing(provider, target.path, target.owner), changes);
+    requireChanged(target.owner, target.file, current, existing(provider, target.path, target.owner), changes);
     target.requireStored();
+    if (target.file.keepsRecords() && addsValues(changes) && refusesLossyValues() && target.file.text() == before) {
+        fail(CMPI_RC_ERR_FAILED, std::string(target.file.fileName) + " was not written.");
+    }
 }
 
 /** The identifier of a new record: from the path or, where that has none, from the instance. */
@@ -229,7 +233,7 @@ void modifyInstance(const Request& request, const CMPIInstance* instance, const 
     requireKept(file, changes);
     if (!changes.empty()) {
         file.requireWritable(sizeOf(changes));
-        const OwnInstance undone(changed(requested, current, undoing(changes, current)));
+        const OwnInstance undone(changed(requested, current, undoing(requested, file, changes, current)));
         orUndone(
             target, [&] { apply(provider, target, current, changes); }, [&] { provider.modify(target.path, undone); });
     }

@@ -11,11 +11,6 @@ namespace gate {
 
 namespace {
 
-/** The switch in the agent's configuration. An agent whose framework has no such operation refuses. */
-bool refusesLossyValues() {
-    return &KO::Settings::getFlag == nullptr || KO::Settings::getFlag("gate.refuse_lossy_values", true);
-}
-
 bool hasWhiteSpace(std::string_view text) {
     return text.find_first_of("\t\n\v\f\r") != std::string_view::npos;
 }
@@ -77,6 +72,11 @@ const char* lossOf(const DataFile& file, const Property& property, const std::st
 
 bool isShown(const DataFile& file, const std::string& dateTime) {
     return isPointInTime(dateTime) || (file.keepsRecords() && isInterval(dateTime));
+}
+
+bool refusesLossyValues() {
+    // An agent whose framework has no such operation refuses.
+    return &KO::Settings::getFlag == nullptr || KO::Settings::getFlag("gate.refuse_lossy_values", true);
 }
 
 void requireKept(const DataFile& file, const Property& property, const std::string& text) {

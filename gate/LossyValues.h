@@ -5,6 +5,9 @@
 
 namespace gate {
 
+/** Whether the agent's configuration lets such values be refused. Else two values may look the same in a file. */
+bool refusesLossyValues();
+
 /**
  * Refuses a value that would not be the same after the object manager is restarted: the data files have their limits
  * (docs/data-files.md), and object managers take blanks off the ends of values. CMPI_RC_ERR_INVALID_PARAMETER with the

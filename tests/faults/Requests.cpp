@@ -183,15 +183,29 @@ const Request& requestNamed(const std::string& name) {
     throw std::out_of_range("no request " + name);
 }
 
-const Request& repairOf(const std::string& dataFile) {
-    static const std::map<std::string, Request> repairs{
+namespace {
+
+/** A change of one value for each file. @param number of the record's term; that with which it is made is 2 */
+std::map<std::string, Request> smallChanges(unsigned int number) {
+    return {
         {leaseFile, changing("repair", leaseFile, identified("VELKO_Lease", "lease number 2"),
-                             {named("LeaseTerm", uint32(2))}, &modify)},
+                             {named("LeaseTerm", uint32(number))}, &modify)},
         {warrantyFile, changing("repair", warrantyFile, identified("VELKO_Warranty", "warranty number 2"),
-                                {named("WarrantyDuration", uint32(2))}, &modify)},
+                                {named("WarrantyDuration", uint32(number))}, &modify)},
         {assetFile, changing("repair", assetFile, assetPath(), {named("SystemLocation", text("repaired"))}, &modify)},
     };
+}
+
+}  // namespace
+
+const Request& repairOf(const std::string& dataFile) {
+    static const std::map<std::string, Request> repairs = smallChanges(2);
     return repairs.at(dataFile);
+}
+
+const Request& detourOf(const std::string& dataFile) {
+    static const std::map<std::string, Request> detours = smallChanges(3);
+    return detours.at(dataFile);
 }
 
 std::string classOf(const std::string& dataFile) {

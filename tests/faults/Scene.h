@@ -113,6 +113,9 @@ const Request& requestNamed(const std::string& name);
  * it the value that it has, or of asset data.
  */
 const Request& repairOf(const std::string& dataFile);
+
+/** A change that repairOf() takes back; for those who do not write what is as it was. */
+const Request& detourOf(const std::string& dataFile);
 ///@}
 
 /** The class whose instances a data file keeps. */
