@@ -75,13 +75,11 @@ private:
     /** What follows a backslash: in a long string also the blanks over which a text goes on. */
     void skipEscaped(bool isLong) {
         const std::size_t blanks = std::min(rest.find_first_not_of(" \t\r\n"), rest.size());
-        if (blanks == 0) {
+        skip(isLong ? blanks : 0);
+        if (!rest.empty() && !isAscii(rest.front())) {
+            reason = "a text that goes on after a backslash must do so with an ASCII character";
+        } else if (blanks == 0) {
             skip(1);
-        } else if (isLong) {
-            skip(blanks);
-            if (!rest.empty() && !isAscii(rest.front())) {
-                reason = "a text that goes on after a backslash must do so with an ASCII character";
-            }
         }
     }
 

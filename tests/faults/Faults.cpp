@@ -119,6 +119,15 @@ void* operator new(std::size_t size) {
     throw std::bad_alloc();
 }
 
+// Sanitizers have one of their own, whose memory the operators below may not free.
+void* operator new(std::size_t size, const std::nothrow_t&) noexcept {
+    try {
+        return operator new(size);
+    } catch (const std::bad_alloc&) {
+        return nullptr;
+    }
+}
+
 void operator delete(void* memory) noexcept {
     std::free(memory);
 }

@@ -47,7 +47,8 @@ protected:
             if (lasting && error == EINTR) {
                 return;  // a call that is interrupted again and again may be made again and again
             }
-            for (int number = 1; number <= course.counts.at(kind) && !HasFailure(); ++number) {
+            const int step = kind == operationAllocate ? ALLOCATION_STEP : 1;
+            for (int number = 1; number <= course.counts.at(kind) && !HasFailure(); number += step) {
                 const Fault fault{kind, number, lasting, error, {}};
                 SCOPED_TRACE(testing::PrintToString(fault));
                 failOne(fault, course);
