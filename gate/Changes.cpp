@@ -139,13 +139,13 @@ Values undoing(const Class& owner, const DataFile& file, const Values& changes, 
     return values;
 }
 
-bool addsValues(const Values& changes) {
+namespace {
+
+bool takeNothingAway(const Values& changes) {
     return std::all_of(changes.begin(), changes.end(), [](const auto& change) {
         return !change.second.empty() && !(change.first->type == CMPI_dateTime && change.second == noDate);
     });
 }
-
-namespace {
 
 /** Fails if a value that was not to be changed is not there any more. */
 void requireNothingLost(const Class& owner, const CMPIInstance* before, const CMPIInstance* after,
@@ -164,7 +164,7 @@ void requireNothingLost(const Class& owner, const CMPIInstance* before, const CM
 
 void requireChanged(const Class& owner, const DataFile& file, const CMPIInstance* before, const CMPIInstance* after,
                     const Values& changes) {
-    if (addsValues(changes)) {  // one that is taken away may have stood behind two properties
+    if (takeNothingAway(changes)) {  // one that is taken away may have stood behind two properties
         requireNothingLost(owner, before, after, changes);
     }
     for (const auto& [property, text] : changes) {

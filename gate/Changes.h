@@ -32,9 +32,6 @@ Values changed(const Class& owner, const CMPIInstance* current, const Values& ch
  */
 Values undoing(const Class& owner, const DataFile& file, const Values& changes, const CMPIInstance* current);
 
-/** Whether a value is there after the changes that was not there before, rather than values being taken away. */
-bool addsValues(const Values& changes);
-
 /** Fails unless the instance, read again after a change, has the changes, and has lost nothing else. */
 void requireChanged(const Class& owner, const DataFile& file, const CMPIInstance* before, const CMPIInstance* after,
                     const Values& changes);
