@@ -96,21 +96,13 @@ void follow(const Request& request, const AssociationFilter& filter, Take take) 
     if (ways.empty()) {
         return;
     }
-    const std::vector<Computer> computers = knownComputers(request);
     const Provider provider(request);
+    const std::vector<Computer> computers = knownComputers(request);
     for (const Way& way : ways) {
         for (const Link& link : linksAlong(way, provider, computers, request.path)) {
             take(way, link, provider);
         }
     }
-}
-
-template <class Answer>
-void giveAll(const Request& request, const std::vector<Answer>& answers) {
-    for (const Answer& answer : answers) {
-        request.give(answer);
-    }
-    request.finish();
 }
 
 /** Drops the answers at a far end that is not of the result class. */
@@ -140,14 +132,26 @@ const CMPIInstance* associationInstance(const Request& request, const Class& ass
 }
 
 std::vector<Link> allLinks(const Request& request, const Class& association) {
-    const std::vector<Computer> computers = knownComputers(request);
-    return linksOf(Provider(request), computers, association);
+    const Provider provider(request);
+    return linksOf(provider, knownComputers(request), association);
 }
 
-/** The associations at the path, each made by a function of its class and link. */
+/** Makes an answer of an association's class and link. */
 template <class Made>
-std::vector<const Made*> referencesBy(const Request& request, const AssociationFilter& filter,
-                                      const Made* (*made)(const Request&, const Class&, const Link&)) {
+using Maker = const Made* (*)(const Request&, const Class&, const Link&);
+
+template <class Made>
+std::vector<const Made*> allBy(const Request& request, const Class& association, Maker<Made> made) {
+    std::vector<const Made*> answers;
+    for (const Link& link : allLinks(request, association)) {
+        answers.push_back(made(request, association, link));
+    }
+    return answers;
+}
+
+/** The associations at the path. */
+template <class Made>
+std::vector<const Made*> referencesBy(const Request& request, const AssociationFilter& filter, Maker<Made> made) {
     std::vector<const Made*> answers;
     const AssociationFilter byAssociation{filter.resultClass, nullptr, filter.role, nullptr};
     follow(request, byAssociation, [&](const Way& way, const Link& link, const Provider&) {
@@ -167,7 +171,7 @@ void associatorNames(const Request& request, const AssociationFilter& filter) {
     follow(request, filter,
            [&](const Way& way, const Link& link, const Provider&) { answers.push_back(way.farOf(link)); });
     restrict(request, filter.resultClass, answers, [](const CMPIObjectPath* path) { return path; });
-    giveAll(request, answers);
+    request.giveAll(answers);
 }
 
 void associators(const Request& request, const AssociationFilter& filter, const char** properties) {
@@ -181,29 +185,23 @@ void associators(const Request& request, const AssociationFilter& filter, const 
         }
     });
     restrict(request, filter.resultClass, answers, pathOf);
-    giveAll(request, answers);
+    request.giveAll(answers);
 }
 
 void references(const Request& request, const AssociationFilter& filter, const char**) {
-    giveAll(request, referencesBy(request, filter, associationInstance));
+    request.giveAll(referencesBy(request, filter, associationInstance));
 }
 
 void referenceNames(const Request& request, const AssociationFilter& filter) {
-    giveAll(request, referencesBy(request, filter, associationPath));
+    request.giveAll(referencesBy(request, filter, associationPath));
 }
 
 void enumerateAssociations(const Request& request, const Class& association) {
-    for (const Link& link : allLinks(request, association)) {
-        request.give(associationInstance(request, association, link));
-    }
-    request.finish();
+    request.giveAll(allBy(request, association, associationInstance));
 }
 
 void enumerateAssociationNames(const Request& request, const Class& association) {
-    for (const Link& link : allLinks(request, association)) {
-        request.give(associationPath(request, association, link));
-    }
-    request.finish();
+    request.giveAll(allBy(request, association, associationPath));
 }
 
 void getAssociation(const Request& request, const Class& association) {

@@ -32,6 +32,11 @@ std::string stored(const Property& property, const std::string& shown) {
     return isChained(property) && shown == shownForEmpty ? std::string() : shown;
 }
 
+/** How a file of records has a property without a value. */
+std::string noValueOf(const Property& property) {
+    return property.type == CMPI_dateTime ? noDate : property.type == CMPI_string ? "" : "0";
+}
+
 /** A datetime in one of the ways to write it: no date and no offset have two. */
 std::string uniform(const std::string& dateTime) {
     constexpr std::string_view noOffset = "+000";
@@ -57,8 +62,11 @@ bool isAsItWas(const Property& property, const CMPIInstance* current, const std:
     if (property.type == CMPI_dateTime) {
         return uniform(text.value_or(noDate)) == uniform(given);
     }
-    if (!text || stored(property, *text) == stored(property, given)) {
-        return text.has_value();
+    if (!text) {
+        return !property.isWritable && property.type == CMPI_string && given.empty();
+    }
+    if (stored(property, *text) == stored(property, given)) {
+        return true;
     }
     const bool mayLackLetters = !property.isWritable || !isListed;
     return property.type == CMPI_string &&
@@ -137,6 +145,20 @@ Values undoing(const Class& owner, const DataFile& file, const Values& changes, 
         }
     }
     return values;
+}
+
+bool areSame(const Values& properties, const CMPIInstance* one, const CMPIInstance* other) {
+    return std::all_of(properties.begin(), properties.end(), [&](const auto& value) {
+        return propertyOf(one, *value.first) == propertyOf(other, *value.first);
+    });
+}
+
+bool showIn(const DataFile& file, const CMPIInstance* current, const Values& changes) {
+    return std::any_of(changes.begin(), changes.end(), [&](const auto& change) {
+        const auto& [property, text] = change;
+        const std::string before = propertyOf(current, *property).value_or(noValueOf(*property));
+        return before != text && isKept(file, *property, before) && isKept(file, *property, text);
+    });
 }
 
 namespace {

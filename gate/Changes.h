@@ -32,6 +32,12 @@ Values changed(const Class& owner, const CMPIInstance* current, const Values& ch
  */
 Values undoing(const Class& owner, const DataFile& file, const Values& changes, const CMPIInstance* current);
 
+/** Whether two instances have the same of each of these properties. */
+bool areSame(const Values& properties, const CMPIInstance* one, const CMPIInstance* other);
+
+/** Whether a file of records cannot be the same after the changes as before. */
+bool showIn(const DataFile& file, const CMPIInstance* current, const Values& changes);
+
 /** Fails unless the instance, read again after a change, has the changes, and has lost nothing else. */
 void requireChanged(const Class& owner, const DataFile& file, const CMPIInstance* before, const CMPIInstance* after,
                     const Values& changes);

@@ -14,7 +14,6 @@
 #include <fstream>
 #include <iterator>
 #include <system_error>
-#include <vector>
 
 namespace gate {
 
@@ -72,25 +71,34 @@ bool hasRoom(const std::string& directory, std::size_t growth) {
     return blocks > (growth + block) / system.f_frsize;
 }
 
-/** The lines of a text each of which is ended; the rest, if there is one, makes a line that is empty. */
-std::vector<std::string> linesOf(const std::string& text) {
-    std::vector<std::string> lines;
-    for (std::size_t begin = 0; begin < text.size();) {
-        const std::size_t end = text.find('\n', begin);
-        lines.push_back(end == std::string::npos ? std::string() : text.substr(begin, end - begin));
-        begin = end == std::string::npos ? text.size() : end + 1;
-    }
-    return lines;
+bool isEndedOnce(std::string_view text) {
+    const bool isEnded = !text.empty() && text.back() == '\n';
+    return isEnded && (text.size() < 2 || text[text.size() - 2] != '\n');
+}
+
+std::size_t linesIn(std::string_view text) {
+    const auto ends = static_cast<std::size_t>(std::count(text.begin(), text.end(), '\n'));
+    return ends + (text.empty() || text.back() == '\n' ? 0U : 1U);
 }
 
 /** The number of records that the file's head tells. */
-std::size_t declaredIn(const std::vector<std::string>& lines) {
+std::size_t declaredIn(std::string_view text) {
     std::size_t number = 0;
-    if (!lines.empty()) {
-        const std::string& head = lines.front();
-        std::from_chars(head.data(), head.data() + head.size(), number);
-    }
+    std::from_chars(text.data(), text.data() + text.size(), number);
     return number;
+}
+
+/** How many lines of a text are that one, of those that stand first in a step. The head is none of them. */
+std::size_t countLines(std::string_view text, std::string_view wanted, std::size_t step) {
+    std::size_t found = 0;
+    std::size_t number = 0;
+    for (std::size_t begin = 0; begin < text.size(); ++number) {
+        const std::size_t end = std::min(text.find('\n', begin), text.size());
+        const bool isFirst = number > 0 && (number - 1) % step == 0;
+        found += isFirst && text.substr(begin, end - begin) == wanted ? 1U : 0U;
+        begin = end + 1;
+    }
+    return found;
 }
 
 }  // namespace
@@ -116,33 +124,35 @@ void DataFile::requireWritable(std::size_t growth) const {
 }
 
 std::string DataFile::text() const {
+    if (!keepsRecords()) {
+        return {};
+    }
     std::ifstream stream(pathOf(*this), std::ios::binary);
     return {std::istreambuf_iterator<char>(stream), std::istreambuf_iterator<char>()};
 }
 
-std::size_t DataFile::recordsOf(const std::string& identifier) const {
+bool DataFile::isWhole(std::string_view text) const {
+    const std::size_t records = declaredIn(text);
+    return linesIn(text) >= 1 + records * linesPerRecord && (records == 0 || isEndedOnce(text));
+}
+
+std::size_t DataFile::recordsIn(std::string_view text, const std::string& identifier) const {
     if (!keepsRecords()) {
         return 0;
     }
-    const std::vector<std::string> lines = linesOf(text());
-    const std::size_t whole = 1 + declaredIn(lines) * linesPerRecord;
-    if (lines.empty() || lines.size() < whole || (whole > 1 && lines.back().empty())) {
+    if (!isWhole(text)) {
         failFor(pathOf(*this), "it does not hold all records; the disk may be full");
     }
     std::string stored = identifier;
     std::replace(stored.begin(), stored.end(), ' ', '_');
-    std::size_t found = 0;
     // Values with line breaks, stored while such were not refused, leave no telling where a record begins.
-    const std::size_t step = lines.size() == whole ? linesPerRecord : 1;
-    for (std::size_t line = 1; line < lines.size(); line += step) {
-        found += lines[line] == stored ? 1U : 0U;
-    }
-    return found;
+    const bool isPlain = linesIn(text) == 1 + declaredIn(text) * linesPerRecord;
+    return countLines(text, stored, isPlain ? linesPerRecord : 1);
 }
 
 std::optional<std::size_t> DataFile::recordsIfWhole(const std::string& identifier) const {
     try {
-        return recordsOf(identifier);
+        return recordsIn(text(), identifier);
     } catch (const Failure&) {
         return std::nullopt;
     }

@@ -5,6 +5,7 @@
 #include <cstddef>
 #include <optional>
 #include <string>
+#include <string_view>
 
 namespace gate {
 
@@ -27,16 +28,19 @@ struct DataFile {
      */
     void requireWritable(std::size_t growth) const;
 
-    /**
-     * How many records the file has with that identifier, 0 for a property file. CMPI_RC_ERR_FAILED when the file is
-     * not whole, that is, when it has not the number of lines that its head tells.
-     */
-    std::size_t recordsOf(const std::string& identifier) const;
-
-    /** All that the file holds; nothing where it cannot be read. */
+    /** All that a file of records holds; nothing where it cannot be read, and for a property file. */
     std::string text() const;
 
-    /** recordsOf(), but none for a file that is not whole. */
+    /**
+     * How many records with that identifier are in the text of a file, 0 for a property file. CMPI_RC_ERR_FAILED when
+     * the text is not whole.
+     */
+    std::size_t recordsIn(std::string_view text, const std::string& identifier) const;
+
+    /** Whether the text of a file of records has the number of lines that its head tells. */
+    bool isWhole(std::string_view text) const;
+
+    /** recordsIn() of the file as it is, but none for one that is not whole. */
     std::optional<std::size_t> recordsIfWhole(const std::string& identifier) const;
 };
 

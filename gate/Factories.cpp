@@ -1,9 +1,11 @@
 #include "AssociationOperations.h"
 #include "Calls.h"
+#include "FixedMessage.h"
 #include "InstanceOperations.h"
 #include "Provider.h"
 
 #include <cxxabi.h>
+#include <dlfcn.h>
 
 #include <chrono>
 #include <exception>
@@ -23,29 +25,47 @@ const struct GateKeeper {
     ~GateKeeper() { theGate.close(patience, Gate::Closing::forGood); }
 } gateKeeper;
 
-/** A status with its reason, as far as memory and the broker allow. */
-CMPIStatus statusOf(const CMPIBroker* broker, CMPIrc rc, const char* text, const char* detail = "") noexcept {
-    try {
-        return {rc, make<&CMPIBrokerEncFT::newString>(broker, (std::string(text) + detail).c_str())};
-    } catch (...) {
-        return {rc, nullptr};
-    }
+FixedMessage closed(closedText);
+FixedMessage stays("The provider keeps its tables in memory.");
+FixedMessage answersNoQueries("This provider answers no queries. Enumerate the class instead.");
+FixedMessage lacksBroker("An object manager that loads this provider has to give it a broker.");
+FixedMessage unspoken("The object manager could not take the reason. It, or this provider, may lack memory.");
+
+CMPIStatus statusOf(CMPIrc rc, FixedMessage& message) {
+    return {rc, message.handle()};
 }
 
-/** Runs what may fail; a status is all that leaves. */
-template <class Work>
-CMPIStatus guarded(const CMPIBroker* broker, Work work) {
+/** A status with its reason, as far as memory and the broker allow; without a broker, with the reason for that. */
+CMPIStatus statusOf(const CMPIBroker* broker, CMPIrc rc, const char* text, const char* detail = "") noexcept {
+    if (broker == nullptr) {
+        return statusOf(rc, closed);
+    }
+    CMPIString* message = nullptr;
+    try {
+        message = make<&CMPIBrokerEncFT::newString>(broker, (std::string(text) + detail).c_str());
+    } catch (...) {
+        message = nullptr;
+    }
+    return message != nullptr ? CMPIStatus{rc, message} : statusOf(rc, unspoken);
+}
+
+/**
+ * Runs what may fail; a status is all that leaves.
+ * @param broker answers the broker for a message: the manager may take it along while the work goes on
+ */
+template <class Broker, class Work>
+CMPIStatus guarded(Broker broker, Work work) {
     try {
         work();
         return {CMPI_RC_OK, nullptr};
     } catch (const abi::__forced_unwind&) {
         throw;  // the thread is being ended: no exception, and not to be stopped
     } catch (const Failure& failure) {
-        return statusOf(broker, failure.rc, failure.text.c_str());
+        return statusOf(broker(), failure.rc, failure.text.c_str());
     } catch (const std::exception& exception) {
-        return statusOf(broker, CMPI_RC_ERR_FAILED, "The request broke off: ", exception.what());
+        return statusOf(broker(), CMPI_RC_ERR_FAILED, "The request broke off: ", exception.what());
     } catch (...) {
-        return statusOf(broker, CMPI_RC_ERR_FAILED, "The request broke off by an exception of an unknown kind.");
+        return statusOf(broker(), CMPI_RC_ERR_FAILED, "The request broke off by an exception of an unknown kind.");
     }
 }
 
@@ -66,9 +86,17 @@ CMPIStatus serve(const CMPIContext* context, const CMPIResult* result, const CMP
     const Visit visit;
     const CMPIBroker* broker = Provider::manager();
     if (!visit.isLetIn || broker == nullptr) {
-        return statusOf(broker, CMPI_RC_ERR_FAILED, closedText);
+        return statusOf(CMPI_RC_ERR_FAILED, closed);
     }
-    return guarded(broker, [&] { operation(Request{broker, context, result, path}); });
+    return guarded(Provider::manager, [&] { operation(Request{broker, context, result, path}); });
+}
+
+/** Keeps this library and those that it needs in the process: a request that stays at the gate is in them. */
+void stayLoaded() {
+    Dl_info self{};
+    if (dladdr(&theGate, &self) != 0) {
+        dlopen(self.dli_fname, RTLD_LAZY | RTLD_NOLOAD | RTLD_NODELETE);  // never closed, which is what it is for
+    }
 }
 
 /**
@@ -77,13 +105,15 @@ CMPIStatus serve(const CMPIContext* context, const CMPIResult* result, const CMP
  */
 CMPIStatus cleanUp(const CMPIContext* context, CMPIBoolean terminating) {
     if (terminating == 0) {
-        return statusOf(Provider::manager(), CMPI_RC_DO_NOT_UNLOAD, "The provider keeps its tables in memory.");
+        return statusOf(CMPI_RC_DO_NOT_UNLOAD, stays);
     }
-    return guarded(Provider::manager(), [&] {
-        if (theGate.close(patience)) {
-            Provider::end(context);
-        }
-    });
+    CMPIStatus status{CMPI_RC_OK, nullptr};
+    theGate.close(patience, Gate::Closing::untilOpened,
+                  [&] { status = guarded(Provider::manager, [&] { Provider::end(context); }); });
+    if (theGate.hasOthers()) {
+        stayLoaded();
+    }
+    return status;
 }
 
 CMPIStatus instanceCleanup(CMPIInstanceMI*, const CMPIContext* context, CMPIBoolean terminating) {
@@ -121,8 +151,7 @@ CMPIStatus remove(CMPIInstanceMI*, const CMPIContext* context, const CMPIResult*
 
 CMPIStatus execQuery(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*, const char*,
                      const char*) {
-    return statusOf(Provider::manager(), CMPI_RC_ERR_NOT_SUPPORTED,
-                    "This provider answers no queries. Enumerate the class instead.");
+    return statusOf(CMPI_RC_ERR_NOT_SUPPORTED, answersNoQueries);
 }
 
 CMPIStatus associationCleanup(CMPIAssociationMI*, const CMPIContext* context, CMPIBoolean terminating) {
@@ -194,11 +223,12 @@ void connect(const CMPIBroker* broker) {
 /** Answers an interface once the provider is connected; null, with the reason in the status, otherwise. */
 template <class Interface>
 Interface* open(const CMPIBroker* broker, CMPIStatus* rc, Interface& interface) {
-    CMPIStatus status{CMPI_RC_ERR_INVALID_PARAMETER, nullptr};  // without a broker there are no words
-    if (broker != nullptr) {
-        theGate.open();
+    CMPIStatus status = statusOf(CMPI_RC_ERR_INVALID_PARAMETER, lacksBroker);
+    if (broker != nullptr && !theGate.open()) {
+        status = statusOf(CMPI_RC_ERR_FAILED, closed);
+    } else if (broker != nullptr) {
         const Visit visit;
-        status = guarded(broker, [&] { connect(broker); });
+        status = guarded([&] { return broker; }, [&] { connect(broker); });
     }
     if (rc != nullptr) {
         *rc = status;

@@ -3,6 +3,8 @@
 #include <pthread.h>
 #include <unistd.h>
 
+#include <utility>
+
 namespace gate {
 
 namespace {
@@ -96,35 +98,59 @@ void Gate::tellClosers() {
     }
 }
 
-bool Gate::close(std::chrono::milliseconds patience, Closing closing) noexcept {
+void Gate::pass() noexcept {
+    if (state == State::shut && !isInsideHere) {
+        comeBack();
+        leave();
+    }
+}
+
+bool Gate::close(std::chrono::milliseconds patience, Closing closing, const std::function<void()>& atEnd) noexcept {
     const pid_t its = process;
     if (its != 0 && its != getpid()) {
         return false;  // the threads that have the lock and the turn are not in this process
     }
     const Uncancelled uncancelled;
     std::unique_lock<std::mutex> lock(mutex);
-    const bool wasOpen = state == State::open;
     isForGood = isForGood || closing == Closing::forGood;
     if (state == State::shut) {
         return false;
     }
     state = State::closing;
+    const std::size_t before = timesShut;
+    const auto isShutByOther = [&] { return timesShut != before; };
     Waiter self;
     self.next = closers;
     closers = &self;
-    self.call.wait_for(lock, patience, [&] { return arrived <= arrivedHere || state == State::shut; });
-    self.call.wait(lock, [&] { return isEmptyButForCaller(); });
-    state = State::shut;
+    self.call.wait_for(lock, patience, [&] { return arrived <= arrivedHere || isShutByOther(); });
+    self.call.wait(lock, [&] { return isEmptyButForCaller() || isShutByOther(); });
+    const bool isMine = !isShutByOther();
+    if (isMine) {
+        shut(lock, atEnd);
+    }
     Waiter** link = &closers;
     while (*link != &self) {
         link = &(*link)->next;
     }
     *link = self.next;
-    tellClosers();
-    return wasOpen;
+    return isMine;
 }
 
-void Gate::open() noexcept {
+/** With the turn taken, so that neither another closer nor who comes back gets in while the end goes on. */
+void Gate::shut(std::unique_lock<std::mutex>& lock, const std::function<void()>& atEnd) {
+    const bool wasTaken = std::exchange(isTaken, true);
+    if (atEnd) {
+        lock.unlock();
+        atEnd();
+        lock.lock();
+    }
+    isTaken = wasTaken;
+    state = State::shut;
+    ++timesShut;
+    tellClosers();
+}
+
+bool Gate::open() noexcept {
     const std::lock_guard<std::mutex> lock(mutex);
     if (state == State::shut && !isForGood) {
         state = State::open;
@@ -132,6 +158,12 @@ void Gate::open() noexcept {
             admitNext();
         }
     }
+    return state == State::open;
+}
+
+bool Gate::hasOthers() const noexcept {
+    const std::lock_guard<std::mutex> lock(mutex);
+    return arrived > arrivedHere;
 }
 
 std::size_t Gate::waiting() const noexcept {

@@ -8,6 +8,7 @@
 #include <chrono>
 #include <condition_variable>
 #include <cstddef>
+#include <functional>
 #include <mutex>
 
 namespace gate {
@@ -44,15 +45,25 @@ public:
     void comeBack() noexcept;
 
     /**
+     * Waits while the gate is shut: for who is outside but is about to call the object manager, which may have gone.
+     */
+    void pass() noexcept;
+
+    /**
      * Shuts the gate when nobody is inside or waits to be, but for the calling thread. Before that it gives the
      * requests that have arrived some time to depart, no more: they may wait for who never answers.
      * Does nothing in a process that was forked off from the one in which the requests are.
-     * @return whether the gate was open
+     * @param atEnd called just before the gate is shut, with nobody else inside; must not throw
+     * @return whether it was this call that shut the gate
      */
-    bool close(std::chrono::milliseconds patience, Closing closing = Closing::untilOpened) noexcept;
+    bool close(std::chrono::milliseconds patience, Closing closing = Closing::untilOpened,
+               const std::function<void()>& atEnd = nullptr) noexcept;
 
-    /** Opens a gate that is shut, unless it is shut for good. */
-    void open() noexcept;
+    /** Opens a gate that is shut. @return whether it is open now: it is not while it closes, or when shut for good */
+    bool open() noexcept;
+
+    /** Whether requests that came on other threads have not departed. */
+    bool hasOthers() const noexcept;
 
     /** How many wait for their turn. */
     std::size_t waiting() const noexcept;
@@ -71,10 +82,12 @@ private:
     void waitForTurn(std::unique_lock<std::mutex>& lock);
     void admitNext();
     bool isEmptyButForCaller() const;
+    void shut(std::unique_lock<std::mutex>& lock, const std::function<void()>& atEnd);
     void tellClosers();
 
     mutable std::mutex mutex{};
-    State state = State::open;
+    std::atomic<State> state{State::open};  ///< changed by who has the lock
+    std::size_t timesShut = 0;
     bool isForGood = false;
     bool isTaken = false;
     std::size_t arrived = 0;

@@ -8,7 +8,10 @@
 #include "Provider.h"
 
 #include <algorithm>
+#include <exception>
 #include <iterator>
+#include <optional>
+#include <string_view>
 
 namespace gate {
 
@@ -48,18 +51,30 @@ struct Target {
 
     std::string identifier() const { return path.key(identifierKey); }
 
-    void requireStored() const {
-        if (file.keepsRecords() && file.recordsOf(identifier()) == 0) {
+    /** @param text what the file holds after the change */
+    void requireStored(std::string_view text) const {
+        if (file.keepsRecords() && file.recordsIn(text, identifier()) == 0) {
             fail(CMPI_RC_ERR_FAILED, std::string(file.fileName) + " does not hold " + identifier() + ".");
         }
     }
 
     /** @param before how many records with the identifier there were before this one was deleted */
     void requireDeleted(std::size_t before) const {
-        const std::size_t after = file.recordsOf(identifier());
+        const std::size_t after = file.recordsIn(file.text(), identifier());
         if (after != 0 && after >= before) {
             fail(CMPI_RC_ERR_FAILED, std::string(file.fileName) + " still holds " + identifier() + ".");
         }
+    }
+
+    /** Whether the file is whole and has as many records with the identifier as before, if that is known. */
+    bool hasAgain(std::optional<std::size_t> before) const {
+        const std::optional<std::size_t> now = file.recordsIfWhole(identifier());
+        return now && now == before.value_or(*now);
+    }
+
+    /** Whether the file is whole and what it was, if that was whole. */
+    bool holdsAgain(const std::string& before) const {
+        return file.recordsIfWhole(identifier()) && (file.text() == before || !file.isWhole(before));
     }
 };
 
@@ -72,33 +87,50 @@ std::size_t sizeOf(const Values& values) {
     return size;
 }
 
+template <class Undo>
+bool isUndoneBy(Undo undo) {
+    try {
+        return undo();
+    } catch (const Failure&) {
+        return false;
+    } catch (const std::exception&) {
+        return false;
+    }
+}
+
 /**
  * Runs a change and its checks. When one fails, the change is undone, and the failure goes on: with a word where the
  * file could not be brought back either.
+ * @param undo answers whether the file is what it was
  */
 template <class Change, class Undo>
 void orUndone(const Target& target, Change change, Undo undo) {
     try {
         change();
     } catch (Failure& failure) {
-        undo();
-        if (!target.file.recordsIfWhole({})) {
-            failure.text += std::string(" ") + target.file.fileName + " stays damaged until the next change succeeds.";
+        if (!isUndoneBy(undo)) {
+            failure.text += std::string(" ") + target.file.fileName;
+            failure.text += target.file.keepsRecords() ? " stays damaged until the next change succeeds."
+                                                       : " is not what it was before.";
         }
         throw;
     } catch (...) {
-        undo();
+        isUndoneBy(undo);
         throw;
     }
 }
 
-/** Makes the changes; fails unless they are stored. */
-void apply(const Provider& provider, const Target& target, const CMPIInstance* current, const Values& changes) {
-    const std::string before = target.file.text();
+/**
+ * Makes the changes; fails unless they are stored.
+ * @param before what the file held
+ */
+void apply(const Provider& provider, const Target& target, const CMPIInstance* current, const Values& changes,
+           const std::string& before) {
     provider.modify(target.path, OwnInstance(changed(target.owner, current, changes)));
     requireChanged(target.owner, target.file, current, existing(provider, target.path, target.owner), changes);
-    target.requireStored();
-    if (target.file.keepsRecords() && refusesLossyValues() && target.file.text() == before) {
+    const std::string after = target.file.text();
+    target.requireStored(after);
+    if (target.file.keepsRecords() && after == before && showIn(target.file, current, changes)) {
         fail(CMPI_RC_ERR_FAILED, std::string(target.file.fileName) + " was not written.");
     }
 }
@@ -140,9 +172,10 @@ void requireReadOnly(const Provider& provider, const Target& target, const Value
 void fillNew(const Provider& provider, const Target& target, const Values& given) {
     const CMPIInstance* current = existing(provider, target.path, target.owner);
     const Values changes = changesTo(current, given, false);
-    target.requireStored();
+    const std::string stored = target.file.text();
+    target.requireStored(stored);
     if (!changes.empty()) {
-        apply(provider, target, current, changes);
+        apply(provider, target, current, changes, stored);
     }
 }
 
@@ -152,10 +185,14 @@ void create(const Request& request, const Provider& provider, const Target& targ
         fail(CMPI_RC_ERR_ALREADY_EXISTS,
              std::string("There is a ") + target.owner.name + " " + target.identifier() + " already.");
     }
+    requireKept(target.file, *findProperty(target.owner, identifierKey), target.identifier());
+    requireKept(target.file, given);
     requireReadOnly(provider, target, given);
     target.file.requireWritable(target.identifier().size() + 1 + sizeOf(given));
     CMPIObjectPath* answer = makePath(request.broker, nameSpaceOf(request.path), target.owner.name);
     addKey(answer, identifierKey, target.identifier());
+    const std::optional<std::size_t> before = target.file.recordsIfWhole(target.identifier());
+    const std::size_t removals = Provider::removals();
     const auto change = [&] {
         provider.create(target.path);
         fillNew(provider, target, given);
@@ -163,7 +200,13 @@ void create(const Request& request, const Provider& provider, const Target& targ
         request.give(answer);
         request.finish();
     };
-    orUndone(target, change, [&] { provider.remove(target.path); });
+    orUndone(target, change, [&] {
+        if (Provider::removals() != removals) {
+            return true;  // while the path went out, somebody may have deleted this record and made another
+        }
+        provider.remove(target.path);
+        return target.hasAgain(before);
+    });
 }
 
 }  // namespace
@@ -175,10 +218,7 @@ void enumerateInstanceNames(const Request& request) {
     }
     const OwnPath classPath(nameSpaceOf(request.path), requested.name);
     const Provider::Paths paths = Provider(request).names(classPath);
-    for (const CMPIObjectPath* path : paths) {
-        request.give(path);
-    }
-    request.finish();
+    request.giveAll(paths);
 }
 
 void enumerateInstances(const Request& request, const char** properties) {
@@ -187,12 +227,9 @@ void enumerateInstances(const Request& request, const char** properties) {
         return enumerateAssociations(request, requested);
     }
     const OwnPath classPath(nameSpaceOf(request.path), requested.name);
-    const PropertyList list(properties);
-    const Provider::Instances instances = Provider(request).instances(classPath);
-    for (const CMPIInstance* instance : instances) {
-        request.give(list.applied(request.broker, instance, requested));
-    }
-    request.finish();
+    Provider::Instances instances = Provider(request).instances(classPath);
+    PropertyList(properties).apply(request.broker, instances, requested);
+    request.giveAll(instances);
 }
 
 void getInstance(const Request& request, const char** properties) {
@@ -212,8 +249,6 @@ void createInstance(const Request& request, const CMPIInstance* instance) {
     requireInstance(instance);
     const std::string identifier = identifierFor(request.path, instance, requested);
     const Values given = valuesFor(requested, instance);
-    requireKept(file, *findProperty(requested, identifierKey), identifier);
-    requireKept(file, given);
     OwnPath path(nameSpaceOf(request.path), requested.name);
     path.addKey(identifierKey, identifier);
     create(request, Provider(request), {requested, file, std::move(path)}, given);
@@ -233,9 +268,15 @@ void modifyInstance(const Request& request, const CMPIInstance* instance, const 
     requireKept(file, changes);
     if (!changes.empty()) {
         file.requireWritable(sizeOf(changes));
-        const OwnInstance undone(changed(requested, current, undoing(requested, file, changes, current)));
-        orUndone(
-            target, [&] { apply(provider, target, current, changes); }, [&] { provider.modify(target.path, undone); });
+        const std::string before = file.text();
+        const Values restored = undoing(requested, file, changes, current);
+        const OwnInstance undone(changed(requested, current, restored));
+        const auto change = [&] { apply(provider, target, current, changes, before); };
+        orUndone(target, change, [&] {
+            provider.modify(target.path, undone);
+            return file.keepsRecords() ? target.holdsAgain(before)
+                                       : areSame(restored, current, existing(provider, target.path, requested));
+        });
     }
 }
 
@@ -247,16 +288,17 @@ void deleteInstance(const Request& request) {
     const CMPIInstance* current = existing(provider, target.path, requested);
     const OwnInstance restored(givenValues(requested, current, PropertyList(nullptr)));
     file.requireWritable(0);
-    const std::size_t before = file.recordsIfWhole(target.identifier()).value_or(0);
+    const std::optional<std::size_t> before = file.recordsIfWhole(target.identifier());
     const auto change = [&] {
         provider.remove(target.path);
-        target.requireDeleted(before);
+        target.requireDeleted(before.value_or(0));
     };
     orUndone(target, change, [&] {
         if (provider.get(target.path) == nullptr) {
             provider.create(target.path);
             provider.modify(target.path, restored);
         }
+        return target.hasAgain(before);
     });
 }
 

@@ -17,8 +17,11 @@ CMPIEnumeration* enumerateComputers(const Request& request) {
     }
     const CMPIObjectPath* classPath = makePath(request.broker, nameSpaceOf(request.path), computerClass);
     CMPIStatus status{CMPI_RC_OK, nullptr};
-    CMPIEnumeration* computers =
-        broker.bft->enumerateInstances(request.broker, request.context, classPath, nullptr, &status);
+    CMPIEnumeration* computers = nullptr;
+    {
+        const Pause pause;
+        computers = broker.bft->enumerateInstances(request.broker, request.context, classPath, nullptr, &status);
+    }
     require(status.rc == CMPI_RC_OK && computers != nullptr, "enumerate computers", status);
     return computers;
 }

@@ -20,7 +20,10 @@ struct Computer {
     const CMPIInstance* instance;
 };
 
-/** Asks the object manager for the computers in the request's namespace, each once. Nobody may have the turn. */
+/**
+ * Asks the object manager for the computers in the request's namespace, each once. The caller has the turn, which
+ * others may take while the object manager asks another provider: maybe one that asks this one.
+ */
 std::vector<Computer> knownComputers(const Request& request);
 
 /** What belongs to the computers by an association, in their order. */

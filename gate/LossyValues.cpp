@@ -74,6 +74,10 @@ bool isShown(const DataFile& file, const std::string& dateTime) {
     return isPointInTime(dateTime) || (file.keepsRecords() && isInterval(dateTime));
 }
 
+bool isKept(const DataFile& file, const Property& property, const std::string& text) {
+    return lossOf(file, property, text) == nullptr;
+}
+
 bool refusesLossyValues() {
     // An agent whose framework has no such operation refuses.
     return &KO::Settings::getFlag == nullptr || KO::Settings::getFlag("gate.refuse_lossy_values", true);

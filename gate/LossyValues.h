@@ -18,6 +18,9 @@ void requireKept(const DataFile& file, const Property& property, const std::stri
 /** The same for every one of the values that can be written. */
 void requireKept(const DataFile& file, const Values& values);
 
+/** Whether a value is the same after the object manager is restarted. */
+bool isKept(const DataFile& file, const Property& property, const std::string& text);
+
 /** Whether the provider shows a datetime that it was given: it shows null for what is none. */
 bool isShown(const DataFile& file, const std::string& dateTime);
 

@@ -1,6 +1,7 @@
 #include "PropertyList.h"
 
 #include "Calls.h"
+#include "Gate.h"
 #include "Objects.h"
 
 #include <algorithm>
@@ -38,8 +39,12 @@ bool PropertyList::has(const Property& property) const {
 }
 
 bool PropertyList::hasAll(const Class& owner) const {
-    return names == nullptr ||
-           std::all_of(owner.begin(), owner.end(), [&](const Property& property) { return has(property); });
+    if (lookedAt != &owner) {
+        lookedAt = &owner;
+        isWhole = names == nullptr ||
+                  std::all_of(owner.begin(), owner.end(), [&](const Property& property) { return has(property); });
+    }
+    return isWhole;
 }
 
 void PropertyList::requireKnown(const Class& owner) const {
@@ -55,6 +60,7 @@ const CMPIInstance* PropertyList::applied(const CMPIBroker* broker, const CMPIIn
     if (hasAll(owner)) {
         return instance;
     }
+    theGate.pass();
     CMPIInstance* made = makeInstance(broker, pathOf(instance));
     // Some managers put all properties of a class into a new instance: this keeps out what nobody asked for.
     // The keys are listed besides: there are managers that do not show what is only named as a key.
@@ -76,6 +82,13 @@ const CMPIInstance* PropertyList::applied(const CMPIBroker* broker, const CMPIIn
         }
     }
     return made;
+}
+
+void PropertyList::apply(const CMPIBroker* broker, std::vector<const CMPIInstance*>& instances,
+                         const Class& owner) const {
+    for (const CMPIInstance*& instance : instances) {
+        instance = applied(broker, instance, owner);
+    }
 }
 
 }  // namespace gate

@@ -5,6 +5,7 @@
 #include "WrappedBroker.h"
 
 #include <algorithm>
+#include <cstddef>
 #include <mutex>
 #include <optional>
 
@@ -25,6 +26,7 @@ struct Connection {
 };
 
 Connection connection;
+std::size_t removalCount = 0;  // changed by who has the turn
 
 /** The object manager's broker once the provider is connected to it, with its tables as they were then. */
 struct Manager {
@@ -160,7 +162,12 @@ void Provider::modify(const OwnPath& path, const OwnInstance& instance) const {
 void Provider::remove(const OwnPath& path) const {
     CapturedResult result;
     CMPIInstanceMI* mi = connection.instances;
+    ++removalCount;
     requireOk(mi->ft->deleteInstance(mi, context, &result.handle, path.handle()));
+}
+
+std::size_t Provider::removals() {
+    return removalCount;
 }
 
 Provider::Paths Provider::associatorNames(const OwnPath& path, const char* associationClass) const {

@@ -7,6 +7,7 @@
 
 #include <cmpift.h>
 
+#include <cstddef>
 #include <string>
 #include <vector>
 
@@ -47,6 +48,9 @@ public:
     void create(const OwnPath& path) const;
     void modify(const OwnPath& path, const OwnInstance& instance) const;
     void remove(const OwnPath& path) const;
+
+    /** How often an instance has been removed, by whomever. */
+    static std::size_t removals();
 
     Paths associatorNames(const OwnPath& path, const char* associationClass) const;
 

@@ -1,13 +1,17 @@
 #include "Request.h"
 
 #include "Calls.h"
+#include "Gate.h"
 #include "Objects.h"
 
 namespace gate {
 
 namespace {
 
-void requireTaken(const CMPIStatus& status) {
+template <auto function, class... Answer>
+void tellResult(const CMPIResult* result, Answer... answer) {
+    theGate.pass();
+    const CMPIStatus status = tell<function>(result, answer...);
     require(status.rc == CMPI_RC_OK, "take the answer", status);
 }
 
@@ -23,15 +27,15 @@ const Class& Request::requestedClass() const {
 }
 
 void Request::give(const CMPIInstance* instance) const {
-    requireTaken(tell<&CMPIResultFT::returnInstance>(result, instance));
+    tellResult<&CMPIResultFT::returnInstance>(result, instance);
 }
 
 void Request::give(const CMPIObjectPath* answer) const {
-    requireTaken(tell<&CMPIResultFT::returnObjectPath>(result, answer));
+    tellResult<&CMPIResultFT::returnObjectPath>(result, answer);
 }
 
 void Request::finish() const {
-    requireTaken(tell<&CMPIResultFT::returnDone>(result));
+    tellResult<&CMPIResultFT::returnDone>(result);
 }
 
 }  // namespace gate

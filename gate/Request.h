@@ -4,6 +4,8 @@
 
 #include <cmpift.h>
 
+#include <vector>
+
 namespace gate {
 
 /** The computers' class. Another provider serves it; this one's associations begin there. */
@@ -25,6 +27,15 @@ struct Request {
 
     /** Ends the answer. */
     void finish() const;
+
+    /** Hands out all answers and ends: called when all are made, so that none goes out of those that fail. */
+    template <class Answer>
+    void giveAll(const std::vector<Answer>& answers) const {
+        for (const Answer& answer : answers) {
+            give(answer);
+        }
+        finish();
+    }
 };
 
 }  // namespace gate

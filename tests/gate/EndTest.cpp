@@ -1,11 +1,13 @@
 #include "GateFixture.h"
 
+#include <atomic>
 #include <condition_variable>
 #include <cstdlib>
 #include <functional>
 #include <mutex>
 #include <thread>
 
+#include "broker/RequestScope.h"
 #include "support/UnderTest.h"
 
 // The end of the object manager, of the process, and of the broker.
@@ -90,6 +92,31 @@ protected:
         }
     }
 
+    /** Ends the process: with 0 if all goes as it should. */
+    [[noreturn]] void outlastTheEnd() {
+        create(firstPlace);
+        WaitingBroker waiting(*broker.handle());
+        gate().createInstanceMI(waiting.handle(), nullptr);
+        gate().createAssociationMI(waiting.handle(), nullptr);
+        std::atomic<bool> isOpenAgain{false};
+        std::thread request([&] {
+            EXPECT_THAT(gate().associatorNames(keyedPath(lease, firstPlace), {}), isAnswered(1));
+            EXPECT_TRUE(isOpenAgain);
+        });
+        waiting.awaitArrival();
+        EXPECT_THAT(gate().cleanupInstanceMI(true), isDone());
+        broker.forget();
+        waiting.release();
+        EXPECT_THAT(gate().getInstance(keyedPath(lease, firstPlace)), isRefused(CMPI_RC_ERR_FAILED, "shutting down"));
+        EXPECT_EQ(broker.count("CMPIEnumerationFT.hasNext"), 0) << "the first call after the up-call";
+        isOpenAgain = true;
+        EXPECT_NE(gate().createInstanceMI(waiting.handle(), nullptr), nullptr);
+        request.join();
+        close();
+        EXPECT_TRUE(isLoaded(GATE_LIBRARY)) << "a request may still have been in it";
+        std::_Exit(testing::Test::HasFailure() ? 1 : 0);
+    }
+
     static int cleanups(const std::string& function) {
         int count = 0;
         for (const auto& record : agentEnvironment::log()) {
@@ -105,11 +132,12 @@ TEST_F(EndTest, AfterTheManagersEndRequestsAreRefusedWithoutACallOfItsBroker) {
     EXPECT_THAT(gate().cleanupInstanceMI(true), isDone());
     EXPECT_THAT(gate().cleanupAssociationMI(true), isDone());
     broker.forget();
-    EXPECT_EQ(gate().enumerateInstances(classPath(lease)).rc, CMPI_RC_ERR_FAILED);
-    EXPECT_EQ(create("L2").rc, CMPI_RC_ERR_FAILED);
-    EXPECT_EQ(gate().associatorNames(keyedPath(lease, "L1"), {}).rc, CMPI_RC_ERR_FAILED);
-    EXPECT_EQ(gate().execQuery(classPath(lease), "WQL", "select").rc, CMPI_RC_ERR_NOT_SUPPORTED);
-    EXPECT_EQ(gate().cleanupInstanceMI(false).rc, CMPI_RC_DO_NOT_UNLOAD);
+    const auto isRefusedForTheEnd = isRefused(CMPI_RC_ERR_FAILED, "shutting down");
+    EXPECT_THAT(gate().enumerateInstances(classPath(lease)), isRefusedForTheEnd);
+    EXPECT_THAT(create("L2"), isRefusedForTheEnd);
+    EXPECT_THAT(gate().associatorNames(keyedPath(lease, "L1"), {}), isRefusedForTheEnd);
+    EXPECT_THAT(gate().execQuery(classPath(lease), "WQL", "select"), isRefused(CMPI_RC_ERR_NOT_SUPPORTED, "queries"));
+    EXPECT_THAT(gate().cleanupInstanceMI(false), isRefused(CMPI_RC_DO_NOT_UNLOAD, "memory"));
     EXPECT_THAT(broker.functions(), IsEmpty());
 }
 
@@ -152,21 +180,48 @@ TEST_F(EndTest, TheManagersEndWaitsForRequestsAndNoneCallsItsBrokerAfterIt) {
     unload();  // before the other broker goes
 }
 
-TEST_F(EndTest, ARequestInAnUpCallIsRefusedAfterItWhenTheManagerEnds) {
+TEST_F(EndTest, ARequestInAnUpCallIsServedWhenTheManagerEnds) {
     create(firstPlace);
     WaitingBroker waiting(*broker.handle());
     gate().createInstanceMI(waiting.handle(), nullptr);
     gate().createAssociationMI(waiting.handle(), nullptr);
-    std::thread request([&] {
-        EXPECT_THAT(gate().associatorNames(keyedPath(lease, firstPlace), {}),
-                    isRefused(CMPI_RC_ERR_FAILED, "shutting down"));
-    });
+    std::thread request([&] { EXPECT_THAT(gate().associatorNames(keyedPath(lease, firstPlace), {}), isAnswered(1)); });
     waiting.awaitArrival();
-    std::thread end([&] { EXPECT_THAT(gate().cleanupInstanceMI(true), isDone()); });
+    std::thread end([&] {
+        EXPECT_THAT(gate().cleanupInstanceMI(true), isDone());
+        broker.forget();
+    });
     awaitRefusal();
     waiting.release();
     end.join();
     request.join();
+    EXPECT_THAT(broker.functions(), IsEmpty()) << "after the end";
+    unload();
+}
+
+/** In a process of its own, since the library stays in it. Waits as long as the gate has patience: some seconds. */
+TEST_F(EndTest, ARequestWhoseUpCallOutlastsTheEndStaysAtTheGateUntilAManagerComes) {
+    testing::FLAGS_gtest_death_test_style = "threadsafe";
+    EXPECT_EXIT(outlastTheEnd(), testing::ExitedWithCode(0), "");
+}
+
+TEST_F(EndTest, AFactoryWhileTheManagerEndsGivesNothingAndSaysWhy) {
+    create(firstPlace);
+    WaitingBroker waiting(*broker.handle());
+    gate().createInstanceMI(waiting.handle(), nullptr);
+    std::thread request([&] { EXPECT_THAT(gate().enumerateInstances(classPath(lease)), isAnswered(1)); });
+    waiting.awaitArrival();
+    std::thread end([&] { EXPECT_THAT(gate().cleanupInstanceMI(true), isDone()); });
+    awaitRefusal();
+    CMPIStatus status{CMPI_RC_OK, nullptr};
+    EXPECT_EQ(gate().createInstanceMI(waiting.handle(), &status), nullptr);
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_FAILED);
+    EXPECT_THAT(cimhost::statusFrom(status).message, testing::HasSubstr("shutting down"));
+    waiting.release();
+    end.join();
+    request.join();
+    EXPECT_NE(gate().createInstanceMI(broker.handle(), nullptr), nullptr) << "the manager goes on";
+    EXPECT_THAT(identifiers(), ElementsAre(firstPlace));
     unload();
 }
 

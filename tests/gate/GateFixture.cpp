@@ -138,8 +138,12 @@ testsupport::ProviderLibrary& GateTest::gate() {
     return *library;
 }
 
-void GateTest::unload() {
+void GateTest::close() {
     library.reset();
+}
+
+void GateTest::unload() {
+    close();
     EXPECT_FALSE(isLoaded(testsupport::underTest(GATE_LIBRARY))) << "the gate stays in the process";
     EXPECT_FALSE(isLoaded(testsupport::underTest(PROVIDER_LIBRARY))) << "the provider stays in the process";
 }

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "support/AgentEnvironment.h"
+#include "support/Files.h"
 #include "support/Outcome.h"
 #include "support/ProviderLibrary.h"
 #include "support/RecordingBroker.h"
@@ -74,7 +75,10 @@ protected:
 
     testsupport::ProviderLibrary& gate();
 
-    /** Closes the library, and the provider with it; the next gate() loads them again. */
+    /** Closes the library; the next gate() loads it again if it went. */
+    void close();
+
+    /** The same; that it and the provider do not go is a failure of the test. */
     void unload();
 
     /** @name Requests for a lease, unless a class is named */
@@ -97,6 +101,22 @@ protected:
 
 private:
     std::unique_ptr<testsupport::ProviderLibrary> library;
+};
+
+/** Turns the refusal off in the agent's configuration while it lives. */
+class RefusalOff {
+public:
+    RefusalOff() : before(testsupport::readFile(file())) {
+        testsupport::writeFile(file(), before + "\n[gate]\nrefuse_lossy_values = false\n");
+    }
+    ~RefusalOff() { testsupport::writeFile(file(), before); }
+    RefusalOff(const RefusalOff&) = delete;
+    RefusalOff& operator=(const RefusalOff&) = delete;
+
+private:
+    static std::filesystem::path file() { return agentEnvironment::directory() / "agent.toml"; }
+
+    std::string before;
 };
 
 }  // namespace gatetest

@@ -15,22 +15,6 @@ using testsupport::dateTime;
 
 using LossyValuesTest = GateTest;
 
-/** Turns the refusal off in the agent's configuration while it lives. */
-class RefusalOff {
-public:
-    RefusalOff() : before(testsupport::readFile(file())) {
-        testsupport::writeFile(file(), before + "\n[gate]\nrefuse_lossy_values = false\n");
-    }
-    ~RefusalOff() { testsupport::writeFile(file(), before); }
-    RefusalOff(const RefusalOff&) = delete;
-    RefusalOff& operator=(const RefusalOff&) = delete;
-
-private:
-    static std::filesystem::path file() { return agentEnvironment::directory() / "agent.toml"; }
-
-    std::string before;
-};
-
 const std::vector<std::pair<std::string, std::string>> lossyTexts{{"ACME_Leasing", "underscore"},
                                                                   {"two\nlines", "line break"},
                                                                   {"a\ttab", "tab"},

@@ -48,6 +48,14 @@ TEST_P(ManagerTest, LeasesAndWarrantiesAreCreatedReadChangedAndDeleted) {
     }
 }
 
+TEST_P(ManagerTest, StaysWithItsTablesWhileIdle) {
+    expectStatus(gate.create("A1", {named("Lessor", text("ACME"))}), CMPI_RC_OK);
+    testsupport::writeFile(agentEnvironment::dataDirectory() / "Lease.dat", "");
+    gate.manager().idle();
+    EXPECT_TRUE(isLoaded(GATE_LIBRARY));
+    EXPECT_THAT(gate.identifiers(lease), ElementsAre("A1")) << "the file is not read again";
+}
+
 TEST_P(ManagerTest, ARecordWithoutIdentifierIsNotCreated) {
     const ObjectPath path = classPath(lease);
     expectStatus(gate.ask({cimhost::Operation::createInstance, path, {}, {path, {}}}), CMPI_RC_ERR_INVALID_PARAMETER);

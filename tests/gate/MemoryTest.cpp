@@ -193,6 +193,7 @@ TEST_P(MemoryTest, WhateverAllocationFailsNothingIsThrownAndTheNextRequestIsServ
         Outcome outcome;
         goesOn = run(number, outcome);
         EXPECT_FALSE(outcome.threw) << "allocation " << number;
+        EXPECT_EQ(outcome.message.empty(), outcome.rc == CMPI_RC_OK) << "allocation " << number;
         EXPECT_THAT(identifiers(), ElementsAre("bystander", firstPlace)) << "allocation " << number;
         EXPECT_EQ(valueIn(got("bystander"), "Lessor"), "First");
         if (std::string(GetParam().name) == "createInstance") {
@@ -217,6 +218,7 @@ TEST(FactoryMemoryTest, WhateverAllocationFailsNothingIsThrown) {
         goesOn = failingAllocation == 0;
         failingAllocation = 0;
         EXPECT_EQ(made == nullptr, status.rc != CMPI_RC_OK) << "allocation " << number;
+        EXPECT_EQ(status.msg == nullptr, status.rc == CMPI_RC_OK) << "allocation " << number;
         EXPECT_NE(factory(broker.handle(), nullptr, &status), nullptr);
     }
 }

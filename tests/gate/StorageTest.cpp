@@ -6,7 +6,9 @@
 #include <sys/resource.h>
 #include <sys/stat.h>
 #include <sys/statvfs.h>
+#include <cerrno>
 #include <csignal>
+#include <cstdio>
 #include <set>
 
 // Changes that cannot be stored.
@@ -50,6 +52,24 @@ struct NoRoom {
     ~NoRoom() { --count; }
     NoRoom(const NoRoom&) = delete;
     NoRoom& operator=(const NoRoom&) = delete;
+};
+
+/** While one of these lives, files can be opened to be written anew only that many times more. */
+struct FewOpenings {
+    static inline int left = -1;  ///< any number
+
+    explicit FewOpenings(int allowed) { left = allowed; }
+    ~FewOpenings() { left = -1; }
+    FewOpenings(const FewOpenings&) = delete;
+    FewOpenings& operator=(const FewOpenings&) = delete;
+
+    static bool take() {
+        if (left > 0) {
+            --left;
+            return true;
+        }
+        return left < 0;
+    }
 };
 
 /** What a change of a lease, each kind once, answers. */
@@ -173,6 +193,42 @@ TEST_F(StorageTest, AFileThatStaysDamagedIsTold) {
     EXPECT_EQ(valueIn(got("L1"), "LeaseTerm"), "0");
 }
 
+TEST_F(StorageTest, AFileThatWasNotWrittenIsTold) {
+    create("L1", {named("Lessor", text("ACME"))});
+    const std::string stored = readFile(dataFile("Lease.dat"));
+    for (const char* lessor : {"Other", ""}) {
+        const FewOpenings none(0);
+        const Outcome outcome = modify("L1", {named("Lessor", text(lessor))});
+        EXPECT_THAT(outcome, isRefused(CMPI_RC_ERR_FAILED, "Lease.dat was not written"));
+        EXPECT_THAT(outcome.message, testing::Not(HasSubstr("damaged"))) << "it never changed";
+        EXPECT_EQ(valueIn(got("L1"), "Lessor"), "ACME");
+    }
+    EXPECT_EQ(readFile(dataFile("Lease.dat")), stored);
+}
+
+TEST_F(StorageTest, AFileThatWasNotWrittenIsToldAlsoWhereLossyValuesArePermitted) {
+    const RefusalOff permitted;
+    create("L1", {named("Lessor", text("A_B"))});
+    EXPECT_THAT(modify("L1", {named("Lessor", text("A B"))}), isDone()) << "the same in the file";
+    const FewOpenings none(0);
+    EXPECT_THAT(modify("L1", {named("Lessor", text("Other"))}),
+                isRefused(CMPI_RC_ERR_FAILED, "Lease.dat was not written"));
+    EXPECT_EQ(valueIn(got("L1"), "Lessor"), "A B");
+}
+
+TEST_F(StorageTest, WhatTheFileKeepsOfAChangeThatIsTakenBackIsTold) {
+    create("L1");
+    {
+        const FewOpenings one(1);
+        EXPECT_THAT(create("L2", {named("Lessor", text("ACME"))}),
+                    isRefused(CMPI_RC_ERR_FAILED, "Lease.dat stays damaged until the next change succeeds"));
+    }
+    EXPECT_THAT(identifiers(), ElementsAre("L1"));
+    EXPECT_THAT(readFile(dataFile("Lease.dat")), HasSubstr("L2\n")) << "it would be back after a restart";
+    EXPECT_THAT(modify("L1", {named("LeaseTerm", uint32(1))}), isDone());
+    EXPECT_THAT(readFile(dataFile("Lease.dat")), testing::Not(HasSubstr("L2\n")));
+}
+
 TEST_F(StorageTest, WithoutRoomNothingIsTouched) {
     create("L1", {named("LeaseTerm", uint32(1))});
     const ObjectPath path = gate().enumerateInstanceNames(classPath(asset)).paths().front();
@@ -220,7 +276,30 @@ TEST_F(StorageTest, ADamagedFileIsMadeWholeByTheNextChange) {
 }  // namespace
 }  // namespace gatetest
 
-/** In the place of the system's, also for the libraries under test. */
+// In the place of the system's, also for the libraries under test.
+
+namespace {
+
+/** Opens a file, or says that there are too many open ones. */
+FILE* openIfAllowed(const char* function, const char* path, const char* mode) {
+    using Function = FILE* (*)(const char*, const char*);
+    if (*mode == 'w' && !gatetest::FewOpenings::take()) {
+        errno = EMFILE;
+        return nullptr;
+    }
+    return reinterpret_cast<Function>(dlsym(RTLD_NEXT, function))(path, mode);
+}
+
+}  // namespace
+
+extern "C" __attribute__((visibility("default"))) FILE* fopen(const char* path, const char* mode) {
+    return openIfAllowed("fopen", path, mode);
+}
+
+extern "C" __attribute__((visibility("default"))) FILE* fopen64(const char* path, const char* mode) {
+    return openIfAllowed("fopen64", path, mode);
+}
+
 extern "C" __attribute__((visibility("default"))) int statvfs(const char* path, struct statvfs* system) noexcept {
     static const auto real = reinterpret_cast<int (*)(const char*, struct statvfs*)>(dlsym(RTLD_NEXT, "statvfs"));
     const int answer = real(path, system);

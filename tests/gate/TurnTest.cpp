@@ -285,11 +285,92 @@ TEST(TurnTest, WhoComesBackToAShutGateWaitsForItToBeOpened) {
     gate.depart();
 }
 
+TEST(TurnTest, WhoPassesWaitsWhileTheGateIsShutOnly) {
+    Gate gate;
+    Diary diary;
+    gate.pass();
+    std::thread late([&] {
+        gate.arrive();
+        diary.note("arrived");
+        diary.await("shut");
+        gate.pass();
+        diary.note("passed");
+        gate.depart();
+    });
+    diary.await("arrived");
+    EXPECT_TRUE(gate.close(std::chrono::seconds(0)));
+    diary.note("shut");
+    awaitQueue(gate, 1);
+    diary.note("opened");
+    EXPECT_TRUE(gate.open());
+    late.join();
+    EXPECT_THAT(diary.all(), ElementsAre("arrived", "shut", "opened", "passed"));
+    EXPECT_TRUE(gate.enter()) << "who passes keeps no turn";
+    gate.leave();
+}
+
+TEST(TurnTest, TheEndComesBeforeTheGateIsShutAndNobodyElseIsInside) {
+    Gate gate;
+    Diary diary;
+    std::thread paused([&] {
+        gate.arrive();
+        EXPECT_TRUE(gate.enter());
+        gate.leave();
+        diary.note("pausing");
+        diary.await("ending");
+        gate.comeBack();
+        diary.note("back");
+        gate.leave();
+        gate.depart();
+    });
+    diary.await("pausing");
+    EXPECT_TRUE(gate.close(std::chrono::seconds(0), Gate::Closing::untilOpened, [&] {
+        diary.note("ending");
+        awaitQueue(gate, 1);
+        EXPECT_FALSE(gate.open()) << "it closes";
+        EXPECT_FALSE(gate.enter());
+        diary.note("ended");
+    }));
+    diary.note("opened");
+    EXPECT_TRUE(gate.open());
+    paused.join();
+    EXPECT_THAT(diary.all(), ElementsAre("pausing", "ending", "ended", "opened", "back"));
+}
+
+TEST(TurnTest, WhoWaitedToCloseDoesNotShutAGateThatWasOpenedSince) {
+    Gate gate;
+    ASSERT_TRUE(gate.arrive());
+    std::atomic<int> ends{0};
+    std::vector<std::thread> threads;
+    for (int number = 0; number < 4; ++number) {
+        threads.emplace_back([&] { gate.close(longEnough, Gate::Closing::untilOpened, [&] { ++ends; }); });
+    }
+    awaitClosing(gate);
+    gate.depart();
+    while (!gate.open()) {
+        std::this_thread::yield();
+    }
+    join(threads);
+    EXPECT_TRUE(ends > 1 || gate.arrive()) << "a closer that came after the opening may shut it";
+}
+
+TEST(TurnTest, OthersThanTheCallerAreToldOf) {
+    Gate gate;
+    EXPECT_FALSE(gate.hasOthers());
+    gate.arrive();
+    EXPECT_FALSE(gate.hasOthers()) << "on this thread";
+    std::thread([&] {
+        EXPECT_TRUE(gate.hasOthers());
+        gate.arrive();
+    }).join();
+    EXPECT_TRUE(gate.hasOthers());
+}
+
 TEST(TurnTest, AGateThatIsClosedForGoodIsNotOpenedAgain) {
     Gate gate;
     gate.close(longEnough);
     gate.close(longEnough, Gate::Closing::forGood);
-    gate.open();
+    EXPECT_FALSE(gate.open());
     EXPECT_FALSE(gate.arrive());
     gate.depart();
 }
