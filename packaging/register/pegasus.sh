@@ -1,5 +1,5 @@
 # How OpenPegasus is found and told, which its server has to run for.
-# shellcheck shell=sh disable=SC2154 # the variables are those of the program that sources this file
+# shellcheck shell=sh disable=SC2034,SC2154 # the variables are those of the program that sources this file
 
 find_pegasus() {
     has cimprovider || has cimmof || has cimserver
@@ -13,28 +13,72 @@ pegasus_server() {
             return 1
         }
     done
-    pegasus_modules=$(cimprovider -l 2>/dev/null </dev/null) || {
+    pegasus_modules >/dev/null || {
         failed "OpenPegasus: its server does not answer, and nothing can be registered without it: start cimserver"
         return 1
     }
 }
 
-pegasus_remove_modules() {
-    for module in $all_modules; do
-        if printf '%s\n' "$pegasus_modules" | grep -qx "$module"; then
-            run cimprovider -r -m "$module" || return 1
+# Those of ours that are registered.
+pegasus_modules() {
+    modules=$(cimprovider -l 2>/dev/null </dev/null) || return 1
+    for module in $(all_modules); do
+        if printf '%s\n' "$modules" | grep -qx "$module"; then
+            echo "$module"
         fi
     done
 }
 
-pegasus_load() {
-    schema=$data/classes.mof
-    [ "$with_qualifiers" = no ] || schema=$data/velko.mof
-    run cimmof -uC -n "$namespace" -I "$data" "$schema" &&
-        run cimmof -n root/PG_InterOp "$data/pegasus/$library.mof" || return 1
-    if has_computer_system; then
-        run cimmof -n root/PG_InterOp "$data/pegasus/ComputerSystemProvider.mof"
+# Module and provider of what is registered of ours.
+pegasus_registered() {
+    for module in $(pegasus_modules); do
+        cimprovider -l -m "$module" </dev/null | sed "s/^/$module /"
+    done
+}
+
+pegasus_has_class() {
+    cimcli gc -n "$namespace" "$1" </dev/null >/dev/null 2>&1
+}
+
+# Computers may be served by another agent's provider: their class is not ours then.
+pegasus_find_other_computers() {
+    others=no
+    if ! has_computers && ! pegasus_modules | grep -qx "$(module_of "$computers")" &&
+        has cimcli && pegasus_has_class "$(classes_of "$computers")"; then
+        others=yes
     fi
+}
+
+pegasus_load_classes() {
+    # shellcheck disable=SC2046 # one word a file: installation directories have no blanks
+    set -- $(our_classes | sed "s|.*|$data/&.mof|")
+    [ "$with_qualifiers" = no ] || set -- "$data/qualifiers.mof" "$@"
+    run cimmof -uc -n "$namespace" "$@"
+}
+
+pegasus_remove_modules() {
+    former_modules=$(pegasus_modules) || return 1
+    for module in $former_modules; do
+        run cimprovider -r -m "$module" || return 1
+    done
+}
+
+pegasus_load_providers() { # LIBRARY
+    run cimmof -n root/PG_InterOp "$data/pegasus/$1.mof" || return 1
+    if has_computers; then
+        run cimmof -n root/PG_InterOp "$data/pegasus/$computers.mof"
+    fi
+}
+
+# A provider's place is taken when the former one is gone. It comes back where the new one is refused.
+pegasus_replace() {
+    pegasus_load_classes && pegasus_remove_modules || return 1
+    pegasus_load_providers "$library" && return
+    if [ -n "$former" ]; then
+        complain "OpenPegasus: trying to register $former again"
+        pegasus_remove_modules && pegasus_load_providers "$former"
+    fi
+    return 1
 }
 
 pegasus_look_for_library() {
@@ -48,11 +92,18 @@ pegasus_look_for_library() {
 
 register_pegasus() {
     pegasus_server || return
-    if pegasus_remove_modules && pegasus_load; then
-        say "OpenPegasus: registered $library"
+    choose_library "$(pegasus_registered)" || {
+        say "OpenPegasus: nothing was registered, and nothing is renewed"
+        return
+    }
+    pegasus_find_other_computers
+    if pegasus_replace; then
+        registered_with=$registered_with,pegasus
+        done_saying "OpenPegasus: registered $library"
         pegasus_look_for_library
     else
-        failed "OpenPegasus: not registered"
+        failed "OpenPegasus: not registered as it should be; now it has:"
+        list_pegasus >&2
     fi
 }
 
@@ -61,8 +112,8 @@ pegasus_delete_classes() {
         say "OpenPegasus: the class definitions stay, since cimcli is not installed to delete them"
         return 0
     }
-    for class in $(all_classes | tac); do
-        if cimcli gc -n "$namespace" "$class" </dev/null >/dev/null 2>&1; then
+    for class in $(our_classes | tac); do
+        if pegasus_has_class "$class"; then
             run cimcli dc -n "$namespace" "$class" || return 1
         fi
     done
@@ -70,21 +121,17 @@ pegasus_delete_classes() {
 
 unregister_pegasus() {
     pegasus_server || return
+    pegasus_find_other_computers
     if pegasus_remove_modules && pegasus_delete_classes; then
-        say "OpenPegasus: unregistered"
+        done_saying "OpenPegasus: unregistered"
     else
-        failed "OpenPegasus: not unregistered"
+        failed "OpenPegasus: not unregistered; now it has:"
+        list_pegasus >&2
     fi
 }
 
 list_pegasus() {
     pegasus_server || return
-    found=no
-    for module in $all_modules; do
-        if printf '%s\n' "$pegasus_modules" | grep -qx "$module"; then
-            found=yes
-            cimprovider -l -m "$module" </dev/null | sed "s/^/OpenPegasus: module $module, provider /"
-        fi
-    done
-    [ "$found" = yes ] || echo "OpenPegasus: nothing is registered"
+    lines=$(pegasus_registered | sed 's/^\([^ ]*\) /OpenPegasus: module \1, provider /')
+    echo "${lines:-OpenPegasus: nothing is registered}"
 }

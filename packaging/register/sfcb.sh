@@ -1,5 +1,5 @@
 # How SFCB is found and told. Its commands work on files: the server may be stopped.
-# shellcheck shell=sh disable=SC2154 # the variables are those of the program that sources this file
+# shellcheck shell=sh disable=SC2034,SC2154 # the variables are those of the program that sources this file
 
 find_sfcb() {
     has sfcbrepos || has sfcbstage || has sfcbd
@@ -12,6 +12,17 @@ sfcb_tools() {
             return 1
         }
     done
+    sfcb_look_for_place
+}
+
+# Sets where stage and registration are. Without an option, the command itself knows best.
+sfcb_look_for_place() {
+    sfcb_place=$sfcb_directory
+    if [ -z "$sfcb_place" ] && has sfcbrepos; then
+        sfcb_place=$(sfcbrepos -h 2>&1 </dev/null | sed -n 's|.*\[\(/.*\)/registration\].*|\1|p')
+    fi
+    sfcb_place=${sfcb_place:-/var/lib/sfcb}
+    sfcb_stanza_file=$sfcb_place/registration/providerRegister
 }
 
 sfcb_stage() {
@@ -22,25 +33,97 @@ sfcb_unstage() {
     run sfcbunstage ${sfcb_directory:+-s "$sfcb_directory/stage"} "$@"
 }
 
-# Makes the repository anew from what is staged. The old one is gone even when that fails.
+# Makes the repository anew from what is staged.
 sfcb_rebuild() {
     run sfcbrepos -f ${sfcb_directory:+-s "$sfcb_directory/stage" -r "$sfcb_directory/registration"}
 }
 
+# Their names in the stage.
+sfcb_registrations() {
+    for file in "$data"/*.reg "$data"/*/*.reg; do
+        [ "$others ${file##*/}" = "yes $computers.reg" ] || echo "${file##*/}"
+    done
+}
+
 sfcb_unstage_all() {
-    for each in $all_registrations; do
+    for each in $(sfcb_registrations); do
         sfcb_unstage -r "$each" || return 1
     done
     # shellcheck disable=SC2046 # one word a class: names of classes have no blanks
-    sfcb_unstage $(all_classes | sed 's/$/.mof/')
+    sfcb_unstage $(our_classes | sed 's/$/.mof/') || return 1
+    sfcb_is_unstaged
 }
 
-sfcb_stage_chosen() {
+# The command ends with success even where it could not delete.
+sfcb_is_unstaged() {
+    [ "$dry_run" = no ] || return 0
+    for each in $(sfcb_registrations | sed 's|^|regs/|') $(our_classes | sed "s|.*|mofs/$namespace/&.mof|"); do
+        [ ! -e "$sfcb_place/stage/$each" ] || {
+            complain "$sfcb_place/stage/$each could not be deleted"
+            return 1
+        }
+    done
+}
+
+sfcb_register_all() {
+    sfcb_unstage_all || return 1
     # shellcheck disable=SC2046 # one word a file: installation directories have no blanks
-    sfcb_stage -r "$registration" $(class_files) || return 1
-    if has_computer_system; then
-        sfcb_stage -r "$data/ComputerSystemProvider.reg"
+    sfcb_stage -r "$(registration_of "$library")" $(our_classes | sed "s|.*|$data/&.mof|") || return 1
+    if has_computers; then
+        sfcb_stage -r "$(registration_of "$computers")"
     fi
+}
+
+# Copies lie beside the originals, so that putting them back is renaming, which takes no space.
+sfcb_save() {
+    [ "$dry_run" = no ] || return 0
+    sfcb_copies=$(mktemp -d "$sfcb_place/before-$program.XXXXXX") || {
+        complain "SFCB: $sfcb_place cannot be written to; is there another --sfcb-directory?"
+        return 1
+    }
+    trap 'sfcb_put_back; exit 1' HUP INT TERM
+    for each in stage registration; do
+        [ ! -e "$sfcb_place/$each" ] || cp -aH "$sfcb_place/$each" "$sfcb_copies/" || {
+            sfcb_discard
+            complain "SFCB: nothing is changed, since no copy could be made of $sfcb_place/$each"
+            return 1
+        }
+    done
+}
+
+sfcb_discard() {
+    [ "$dry_run" = yes ] || rm -rf "$sfcb_copies"
+    trap - HUP INT TERM
+}
+
+# Another run of sfcbrepos would not do: after a first that broke off, it deletes the last good repository.
+sfcb_put_back() {
+    for each in stage registration; do
+        sfcb_put_back_one "$each" || {
+            complain "SFCB: what was there could not be put back: it is in $sfcb_copies"
+            return
+        }
+    done
+    complain "SFCB: what was there before has been put back"
+    sfcb_discard
+}
+
+sfcb_put_back_one() {
+    if [ -e "$sfcb_place/$1" ]; then
+        mv "$sfcb_place/$1" "$sfcb_copies/failed-$1" || return 1
+    fi
+    [ ! -e "$sfcb_copies/$1" ] || mv "$sfcb_copies/$1" "$sfcb_place/$1"
+}
+
+# Does a step with what is staged, and makes the repository of it.
+sfcb_change() { # STEP
+    sfcb_save || return 1
+    if "$1" && sfcb_rebuild; then
+        sfcb_discard
+        return 0
+    fi
+    [ "$dry_run" = yes ] || sfcb_put_back
+    return 1
 }
 
 # SFCB reads its repository when it starts, and may be stopped meanwhile.
@@ -50,12 +133,12 @@ sfcb_restart() {
             if [ "$restart" = yes ]; then
                 run systemctl restart "$unit" || failed "SFCB: restart it by hand: until then it serves what it did"
             else
-                say "SFCB is running: it takes effect when it is restarted (systemctl restart $unit)"
+                done_saying "SFCB is running: it takes effect when it is restarted (systemctl restart $unit)"
             fi
             return
         fi
     done
-    say "SFCB: if its server is running, it takes effect when it is restarted"
+    done_saying "SFCB: if its server is running, it takes effect when it is restarted"
 }
 
 # A library is found by its name alone, in the directories that the configuration lists.
@@ -68,23 +151,53 @@ sfcb_look_for_library() {
     esac
 }
 
+# Prints class and provider of each stanza that comes in.
+sfcb_stanzas() {
+    awk '/^[ \t]*\[/ { class = $0; gsub(/[][ \t\r]/, "", class) }
+         tolower($1) == "provider:" { print class, $2 }'
+}
+
+# Class and provider of what is registered of ours.
+sfcb_registered() {
+    [ -r "$sfcb_stanza_file" ] || return 0
+    sfcb_stanzas <"$sfcb_stanza_file" | while read -r class name; do
+        [ -z "$(registration_of "$name")" ] || echo "$class $name"
+    done
+}
+
+# Computers may be served by another agent's provider: what it has staged of them is not ours then.
+sfcb_find_other_computers() {
+    others=no
+    has_computers && return
+    for class in $(classes_of "$computers"); do
+        if cat "$sfcb_place"/stage/regs/*.reg 2>/dev/null | sfcb_stanzas | grep "^$class " | grep -qv " $computers\$"; then
+            others=yes
+        fi
+    done
+}
+
 register_sfcb() {
     sfcb_tools || return
-    if sfcb_unstage_all && sfcb_stage_chosen && sfcb_rebuild; then
-        say "SFCB: registered $library"
+    choose_library "$(sfcb_registered)" || {
+        say "SFCB: nothing was registered, and nothing is renewed"
+        return
+    }
+    sfcb_find_other_computers
+    if sfcb_change sfcb_register_all; then
+        registered_with=$registered_with,sfcb
+        done_saying "SFCB: registered $library"
         sfcb_look_for_library
         sfcb_restart
     else
-        # Whatever was wrong with ours, the classes of others are to be there.
-        sfcb_unstage_all && sfcb_rebuild
-        failed "SFCB: not registered; what was staged has been taken back"
+        failed "SFCB: not registered"
     fi
 }
 
 unregister_sfcb() {
     sfcb_tools || return
-    if sfcb_unstage_all && sfcb_rebuild; then
-        say "SFCB: unregistered"
+    sfcb_find_other_computers
+    if sfcb_change sfcb_unstage_all; then
+        done_saying "SFCB: unregistered"
         sfcb_restart
     else
         failed "SFCB: not unregistered"
@@ -92,13 +205,11 @@ unregister_sfcb() {
 }
 
 list_sfcb() {
-    file=${sfcb_directory:-/var/lib/sfcb}/registration/providerRegister
-    if [ ! -r "$file" ]; then
-        failed "SFCB: $file cannot be read; is there another --sfcb-directory?"
+    sfcb_look_for_place
+    if [ ! -r "$sfcb_stanza_file" ]; then
+        failed "SFCB: $sfcb_stanza_file cannot be read; is there another --sfcb-directory?"
         return
     fi
-    awk -v ours=" LeaseAndWarrantyProvider LeaseAndWarrantyGate ComputerSystemProvider " '
-        /^[ \t]*\[/ { class = $0; gsub(/[][ \t]/, "", class) }
-        tolower($1) == "provider:" && index(ours, " " $2 " ") { print "SFCB: " class " by " $2; found = 1 }
-        END { if (!found) print "SFCB: nothing is registered" }' "$file"
+    lines=$(sfcb_registered | sed 's/^/SFCB: /; s/ \([^ ]*\)$/ by \1/')
+    echo "${lines:-SFCB: nothing is registered}"
 }

@@ -1,22 +1,44 @@
 # How the classes are asked for through the object manager.
 # shellcheck shell=sh disable=SC2154 # the variables are those of the program that sources this file
 
-# Prints the paths of a class's instances as one of the clients does. Only cimcli needs no --url.
-ask() {
-    case $client in
-    wbemcli) wbemcli ein "$url/$namespace:$1" ;;
-    pywbemcli) ask_pywbemcli "$1" ;;
-    cimcli) cimcli ni -n "$namespace" "$1" ;;
-    esac </dev/null 2>&1
+# Sets the parts of the URL that clients take as options: scheme, server (host and port), user, password.
+split_url() {
+    scheme=${url%%://*} server=${url#*://} user='' password=''
+    case $server in
+    *@*)
+        user=${server%@*} server=${server##*@}
+        case $user in
+        *:*) password=${user#*:} user=${user%%:*} ;;
+        esac
+        ;;
+    esac
 }
 
-# This client takes no name and password in the URL.
+# Prints the paths of a class's instances as one of the clients does.
+ask() {
+    "ask_$client" "$1" </dev/null 2>&1
+}
+
+ask_wbemcli() {
+    set -- "$url/$namespace:$1"
+    [ "$no_verify" = no ] || set -- -noverify "$@"
+    wbemcli ein "$@"
+}
+
 ask_pywbemcli() {
-    server=$(printf '%s\n' "$url" | sed 's|//[^@/]*@|//|')
-    credentials=$(printf '%s\n' "$url" | sed -n 's|^[^/]*//\([^@/]*\)@.*|\1|p')
-    set -- --server "$server" ${credentials:+--user "${credentials%%:*}" --password "${credentials#*:}"} \
-        instance enumerate "$1" --names-only --namespace "$namespace"
-    pywbemcli "$@"
+    set -- instance enumerate "$1" --names-only --namespace "$namespace"
+    [ -z "$user" ] || set -- --user "$user" --password "$password" "$@"
+    [ "$no_verify" = no ] || set -- --no-verify "$@"
+    pywbemcli --server "$scheme://$server" "$@"
+}
+
+# This client takes any certificate, and finds a server of this machine best when it is told nothing.
+ask_cimcli() {
+    set -- -n "$namespace" "$1"
+    [ -z "$user" ] || set -- -u "$user" -p "$password" "$@"
+    [ "$scheme" != https ] || set -- -s "$@"
+    [ -z "$url_given" ] || set -- -l "$server" "$@"
+    cimcli ni "$@"
 }
 
 # wbemcli says what went wrong in lines of its own.
@@ -41,7 +63,8 @@ verify() {
         complain "no client is installed to verify with: wbemcli, pywbemcli or cimcli"
         exit 4
     fi
-    for class in $(registered_classes); do
+    split_url
+    for class in $(classes_of "$gate") $(! has_computers || classes_of "$computers"); do
         verify_class "$class"
     done
 }

@@ -23,8 +23,9 @@ class Surroundings:
         self.directory = pathlib.Path(place.name)
         self.data_directory = self.directory / "data"
         self.log = self.directory / "ostrel.log"
-        for name in ("data", "bin", "stand-in/fail"):
+        for name in ("data", "bin", "stand-in/fail", "stand-in/sfcb/stage"):
             (self.directory / name).mkdir(parents=True)
+        (self.directory / "stand-in/sfcb/stage/default.reg").write_text("[Default]\n#\n", encoding="utf-8")
         for name in stand_ins:
             (self.directory / "bin" / name).symlink_to(STAND_INS)
         self.environment = {
