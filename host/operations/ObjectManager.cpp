@@ -103,7 +103,20 @@ Interface* ObjectManager::started(const ServedClass& served) {
     return pool.get<Interface>(address);
 }
 
+template <class Interface>
+RawAnswer ObjectManager::ask(const ServedClass& served, const Request& request) {
+    RawAnswer answer = runRequest(itsBroker, started<Interface>(served), request);
+    if (!fatality(answer, request.operation).empty()) {
+        pool.lose(served.address.location);
+    }
+    return answer;
+}
+
 Answer<std::vector<RawAnswer>> ObjectManager::run(Request request) {
+    const ProviderPool::Stay stay(pool);
+    if (pool.isStopped()) {
+        return {{CMPI_RC_ERR_FAILED, "The object manager is stopping."}, {}};
+    }
     if (!providers.knowsNameSpace(request.path.nameSpace)) {
         return {{CMPI_RC_ERR_INVALID_NAMESPACE, "There is no namespace " + request.path.nameSpace + "."}, {}};
     }
@@ -122,7 +135,7 @@ Answer<std::vector<RawAnswer>> ObjectManager::runForInstance(Request request) {
     if (!refusal.ok()) {
         return {refusal, {}};
     }
-    return {{}, {runRequest(itsBroker, started<CMPIInstanceMI>(*served), request)}};
+    return {{}, {ask<CMPIInstanceMI>(*served, request)}};
 }
 
 Answer<std::vector<RawAnswer>> ObjectManager::runForAssociation(Request request) {
@@ -142,7 +155,7 @@ Answer<std::vector<RawAnswer>> ObjectManager::runForAssociation(Request request)
             const bool isAsked = asked && sameName(served->className, *asked);
             request.filter.*associationClass = isAsked ? *asked : served->className;
         }
-        answers.push_back(runRequest(itsBroker, started<CMPIAssociationMI>(*served), request));
+        answers.push_back(ask<CMPIAssociationMI>(*served, request));
     }
     return {{}, std::move(answers)};
 }

@@ -31,6 +31,8 @@ struct ObjectManagerOptions {
  * CMPI_RC_ERR_INVALID_NAMESPACE and CMPI_RC_ERR_INVALID_CLASS when no provider is registered; CMPI_RC_ERR_FAILED
  * when an exception leaves the provider or it returns what the operation does not give;
  * CMPI_RC_ERR_NOT_FOUND when getInstance succeeds without an instance.
+ * Where the manager's provider process would have ended, the provider's library is unloaded, without cleanup, as soon
+ * as no request is inside: what it had in memory is lost.
  * A provider that cannot be loaded is a LibraryError (to a provider's up-call: CMPI_RC_ERR_FAILED with its text).
  *
  * The context of a request is what the caller gives, completed by the options' entries and by CMPIInvocationFlags
@@ -57,6 +59,12 @@ public:
      * ask to stay are unloaded, to be loaded again when they are needed. Not while a request is inside.
      */
     void idle() { pool.idle(); }
+
+    /**
+     * The end of the manager, which does not wait for requests that are inside: all providers are cleaned up for good,
+     * and requests that come from then on, up-calls too, are answered CMPI_RC_ERR_FAILED.
+     */
+    void stop() { pool.stop(); }
 
     const ProviderRegistry& registry() const { return providers; }
     Broker& broker() { return itsBroker; }
@@ -109,6 +117,10 @@ private:
     /** The interface of a class's provider, with the other one where a manager starts both. */
     template <class Interface>
     Interface* started(const ServedClass& served);
+
+    /** What the class's provider answers. */
+    template <class Interface>
+    RawAnswer ask(const ServedClass& served, const Request& request);
 
     ContextEntries baseContext;
     ProviderRegistry providers;

@@ -5,6 +5,7 @@
 #include <tuple>
 #include <type_traits>
 #include <utility>
+#include <vector>
 
 #include "operations/LibraryError.h"
 
@@ -34,9 +35,16 @@ ProviderPool::ProviderPool(Broker& itsBroker, LibraryOptions itsOptions)
     : broker(itsBroker), options(std::move(itsOptions)) {}
 
 ProviderPool::~ProviderPool() {
-    for (auto& [address, provider] : providers) {
-        end(provider, provider.instance);
-        end(provider, provider.association);
+    stop();
+}
+
+ProviderPool::Stay::Stay(ProviderPool& itsPool) : pool(itsPool) {
+    ++pool.staying;
+}
+
+ProviderPool::Stay::~Stay() {
+    if (--pool.staying == 0) {
+        pool.unloadLost();
     }
 }
 
@@ -80,20 +88,59 @@ void ProviderPool::idle() {
             ++library;
             continue;
         }
-        for (auto provider = providers.begin(); provider != providers.end();) {
-            provider = provider->second.library == loaded ? providers.erase(provider) : std::next(provider);
+        library = unload(library);
+    }
+}
+
+ProviderPool::Libraries::iterator ProviderPool::unload(Libraries::iterator library) {
+    for (auto provider = providers.begin(); provider != providers.end();) {
+        provider = provider->second.library == library->second.get() ? providers.erase(provider) : std::next(provider);
+    }
+    return libraries.erase(library);
+}
+
+void ProviderPool::lose(const std::string& location) {
+    const std::lock_guard<std::mutex> lock(lostMutex);
+    lost.insert(location);
+}
+
+/** Who begins to stay meanwhile waits for the mutex before it has an interface. */
+void ProviderPool::unloadLost() {
+    const std::lock_guard<std::mutex> lostLock(lostMutex);
+    if (lost.empty()) {
+        return;
+    }
+    const std::lock_guard<ChainMutex> lock(mutex);
+    for (auto location = lost.begin(); location != lost.end() && staying == 0; location = lost.erase(location)) {
+        const auto library = libraries.find(*location);
+        if (library != libraries.end()) {
+            unload(library);
         }
-        library = libraries.erase(library);
+    }
+}
+
+/** A cleanup may wait for requests, which may need the mutex: it is not held then. */
+void ProviderPool::stop() {
+    if (stopped.exchange(true)) {
+        return;
+    }
+    std::vector<Provider*> all;
+    {
+        const std::lock_guard<ChainMutex> lock(mutex);
+        for (auto& [address, provider] : providers) {
+            all.push_back(&provider);
+        }
+    }
+    for (Provider* provider : all) {
+        end(*provider->library, provider->instance);
+        end(*provider->library, provider->association);
     }
 }
 
 template <class Interface>
-void ProviderPool::end(Provider& provider, Interface* interface) {
-    if (interface == nullptr) {
-        return;
-    }
-    if (asksToStay(cleanUp(interface, broker, true))) {
-        provider.library->keep();
+void ProviderPool::end(LoadedLibrary& library, Interface* interface) {
+    if (interface != nullptr && asksToStay(cleanUp(interface, broker, true))) {
+        library.keep();
     }
 }
 

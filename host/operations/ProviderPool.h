@@ -1,7 +1,11 @@
 #pragma once
 
+#include <atomic>
+#include <cstddef>
 #include <map>
 #include <memory>
+#include <mutex>
+#include <set>
 #include <string>
 
 #include "operations/Interfaces.h"
@@ -23,12 +27,34 @@ public:
     ProviderPool(const ProviderPool&) = delete;
     ProviderPool& operator=(const ProviderPool&) = delete;
 
-    /** The provider's interface; good as long as the pool. @throws LibraryError when it cannot be had */
+    /** A request's stay with the providers; requests may come out of requests. */
+    class Stay {
+    public:
+        explicit Stay(ProviderPool& itsPool);
+        ~Stay();
+        Stay(const Stay&) = delete;
+        Stay& operator=(const Stay&) = delete;
+
+    private:
+        ProviderPool& pool;
+    };
+
+    /** The provider's interface; good while the caller stays. @throws LibraryError when it cannot be had */
     template <class Interface>
     Interface* get(const ProviderAddress& address);
 
     /** Cleans up all providers and unloads the libraries that do not ask to stay. Not while a request is inside. */
     void idle();
+
+    /**
+     * A library's process has ended: the library goes, without cleanup, when no request is inside, and is loaded again
+     * when it is needed.
+     */
+    void lose(const std::string& location);
+
+    /** Cleans up all providers for good, though requests may be inside. Libraries stay until the pool ends. */
+    void stop();
+    bool isStopped() const { return stopped; }
 
 private:
     /** A provider in its library, with the interfaces made so far. */
@@ -48,8 +74,14 @@ private:
     template <class Interface>
     static Interface*& member(Provider& provider);
 
+    using Libraries = std::map<std::string, std::unique_ptr<LoadedLibrary>>;  ///< by location
+
     template <class Interface>
-    void end(Provider& provider, Interface* interface);
+    void end(LoadedLibrary& library, Interface* interface);
+
+    /** Closes a library, and forgets its providers. */
+    Libraries::iterator unload(Libraries::iterator library);
+    void unloadLost();
 
     /** Cleans up the providers of a library; whether it stays. */
     bool staysWhenIdle(const LoadedLibrary& library);
@@ -60,8 +92,12 @@ private:
     Broker& broker;
     LibraryOptions options;
     ChainMutex mutex;  ///< held while a factory runs, which may make a request that needs another provider
-    std::map<std::string, std::unique_ptr<LoadedLibrary>> libraries;  ///< by location
+    Libraries libraries;
     std::map<ProviderAddress, Provider, AddressLess> providers;
+    std::atomic<std::size_t> staying{0};
+    std::mutex lostMutex{};
+    std::set<std::string> lost;  ///< locations of libraries that go when nobody stays
+    std::atomic<bool> stopped{false};
 };
 
 }  // namespace cimhost

@@ -98,6 +98,50 @@ TEST_F(ManagerLoadingTest, AnIdleLibraryStaysIfOneInterfaceAsksOrIfAllDo) {
     }
 }
 
+TEST_F(ManagerLoadingTest, WhatAProcessHadInMemoryThatDiedIsLost) {
+    options.manager = Manager::sfcb;
+    EXPECT_TRUE(manager().enumerateInstances({}, classPath("Sample_Thing"), {}).ok());
+    EXPECT_THAT(manager().enumerateInstances({}, classPath("Sample_Throwing"), {}).status.message, HasSubstr("died"));
+    EXPECT_FALSE(isLoaded("libSampleProvider.so"));
+    log.clear();
+    EXPECT_TRUE(manager().enumerateInstances({}, classPath("Sample_Thing"), {}).ok()) << "it is started again";
+    EXPECT_THAT(log, testing::ElementsAre("instance factory")) << "without a cleanup before";
+    started.reset();
+    options.manager = Manager::openPegasus;
+    EXPECT_EQ(manager().enumerateInstances({}, classPath("Sample_Throwing"), {}).status.rc, CMPI_RC_ERR_FAILED);
+    EXPECT_TRUE(isLoaded("libSampleProvider.so")) << "it lives on";
+}
+
+TEST_F(ManagerLoadingTest, ALibraryIsLostWhenNobodyIsInsideAnyMore) {
+    options.manager = Manager::sfcb;
+    EXPECT_FALSE(manager().enumerateInstances({}, classPath("Sample_CallsSample_Throwing"), {}).ok());
+    EXPECT_FALSE(isLoaded("libSampleProvider.so"));
+}
+
+TEST_F(ManagerLoadingTest, StoppingDoesNotWaitForWhoIsInside) {
+    add("Witness_Thing", "Witness", "WitnessProvider", true, false);
+    add("Sample_CallsWitness_Thing", "Sample", "SampleProvider", true, false);
+    for (const Manager each : testsupport::everyManager) {
+        started.reset();
+        options.manager = each;
+        log.clear();
+        awaited = "witness factory";
+        whenLogged = [this] {
+            manager().stop();
+            log.emplace_back("stopped");
+        };
+        manager().enumerateInstances({}, classPath("Sample_CallsWitness_Thing"), {});
+        EXPECT_THAT(
+            log, testing::ElementsAre("instance factory", "witness factory", "instance cleanup at the end", "stopped"));
+        const auto late = manager().enumerateInstances({}, classPath("Sample_Thing"), {});
+        EXPECT_EQ(late.status.rc, CMPI_RC_ERR_FAILED);
+        EXPECT_EQ(late.status.message, "The object manager is stopping.");
+        log.clear();
+        started.reset();
+        EXPECT_THAT(log, IsEmpty()) << "nothing is cleaned up twice";
+    }
+}
+
 TEST_F(ManagerLoadingTest, FactoriesOfTwoClassesMayRunAtATime) {
     options.manager = Manager::sfcb;
     manager();

@@ -3,6 +3,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <functional>
 #include <memory>
 #include <string>
 #include <vector>
@@ -42,7 +43,13 @@ protected:
     cimhost::ObjectManager& manager() {
         if (!started) {
             options.libraries.searchPath = {"/nonexistent", TEST_PROVIDERS};
-            options.log = [this](const cimhost::LogRecord& record) { log.push_back(record.text); };
+            options.log = [this](const cimhost::LogRecord& record) {
+                log.push_back(record.text);
+                if (record.text == awaited) {
+                    awaited.clear();
+                    whenLogged();
+                }
+            };
             started = std::make_unique<cimhost::ObjectManager>(options, registry);
         }
         return *started;
@@ -55,6 +62,9 @@ protected:
     static cimhost::ObjectPath named(const char* className, const char* name) {
         return testsupport::objectPath("root/cimv2", className, {testsupport::named("Name", testsupport::text(name))});
     }
+
+    std::string awaited;               ///< at which text whenLogged is called, once
+    std::function<void()> whenLogged;  ///< inside of the provider's call
 
     std::vector<std::string> log;  ///< what providers logged; outlives the manager, whose end is logged too
     cimhost::ObjectManagerOptions options;
