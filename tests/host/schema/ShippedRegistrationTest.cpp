@@ -16,7 +16,7 @@ const std::filesystem::path directory = SCHEMA_DIRECTORY;
 constexpr auto pegasusClasses = R"(
     class PG_ProviderModule {
         [Key] string Name; string Vendor; string Version; string InterfaceType; string InterfaceVersion;
-        string Location;
+        string Location; uint16 UserContext;
     };
     class PG_Provider { [Key] string ProviderModuleName; [Key] string Name; };
     class PG_ProviderCapabilities {
@@ -92,6 +92,7 @@ TEST_P(ShippedRegistration, NamesTheLibraryToOpenPegasus) {
     EXPECT_EQ(modules[0].at("Version"), quoted(PROJECT_VERSION));
     EXPECT_EQ(modules[0].at("InterfaceType"), quoted("CMPI"));
     EXPECT_EQ(modules[0].at("InterfaceVersion"), quoted("2.0.0"));
+    EXPECT_EQ(modules[0].at("UserContext"), "4") << "the privileged user, not whoever asks";
     const auto providers = instancesOf("PG_Provider");
     ASSERT_EQ(providers.size(), 1U);
     EXPECT_EQ(providers[0].at("ProviderModuleName"), quoted(GetParam().module));
