@@ -14,7 +14,7 @@ namespace gatetest {
 namespace {
 
 constexpr int clients = 8;
-constexpr int rounds = 20;
+constexpr int rounds = 20 / SHARES;
 
 /** Ends the program when it has not gone by in time: requests that wait for each other would never end. */
 class Deadline {
