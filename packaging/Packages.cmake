@@ -21,6 +21,22 @@ set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS_PRIVATE_DIRS ${CMAKE_LIBRARY_OUTPUT_DIRECTORY
 
 set(debian ${CMAKE_CURRENT_LIST_DIR}/debian)
 
+# law_control_files(<component> <variable>)
+# The files of debian/<component> that control its package. What ends in .in is configured.
+function(law_control_files component variable)
+    file(GLOB files CONFIGURE_DEPENDS ${debian}/${component}/*)
+    list(REMOVE_ITEM files ${debian}/${component}/lintian-overrides)
+    set(templates ${files})
+    list(FILTER templates INCLUDE REGEX "\\.in$")
+    foreach(template IN LISTS templates)
+        cmake_path(GET template STEM LAST_ONLY name)
+        configure_file(${template} ${CMAKE_CURRENT_BINARY_DIR}/debian/${component}/${name} @ONLY)
+        list(REMOVE_ITEM files ${template})
+        list(APPEND files ${CMAKE_CURRENT_BINARY_DIR}/debian/${component}/${name})
+    endforeach()
+    set(${variable} ${files} PARENT_SCOPE)
+endfunction()
+
 # law_package(<component> <name> DESCRIPTION <summary and lines> [DEPENDS <packages>] [SECTION <section>]
 #             [DOCUMENTS <names>])
 # What the package of a component is called and says of itself, and which files and directories of docs/ it brings. Its
@@ -35,27 +51,50 @@ macro(law_package component name)
     if(arg_SECTION)
         set(CPACK_DEBIAN_${key}_PACKAGE_SECTION ${arg_SECTION})
     endif()
-    file(GLOB CPACK_DEBIAN_${key}_PACKAGE_CONTROL_EXTRA CONFIGURE_DEPENDS ${debian}/${component}/*)
-    list(REMOVE_ITEM CPACK_DEBIAN_${key}_PACKAGE_CONTROL_EXTRA ${debian}/${component}/lintian-overrides)
+    law_control_files(${component} CPACK_DEBIAN_${key}_PACKAGE_CONTROL_EXTRA)
 
     set(documents ${CMAKE_INSTALL_DATADIR}/doc/${name})
     install(FILES ${debian}/copyright DESTINATION ${documents} COMPONENT ${component})
     foreach(document IN LISTS arg_DOCUMENTS)
-        law_install_document(${document} ${documents} ${component})
+        law_install_document(${document} ${name} ${component})
     endforeach()
     law_install_compressed(${PROJECT_SOURCE_DIR}/CHANGELOG.md changelog.gz ${documents} ${component})
     law_install_compressed(${debian}/changelog changelog.Debian.gz ${documents} ${component})
     law_install_overrides(${component} ${name})
 endmacro()
 
-# law_install_document(<name> <directory> <component>)
-function(law_install_document name directory component)
+# Documents that are in another package than that of the provider.
+set(package_of_agent.md ostrel-reference-agent)
+set(package_of_cimhost.md cimhost)
+file(GLOB linked CONFIGURE_DEPENDS RELATIVE ${PROJECT_SOURCE_DIR}/docs ${PROJECT_SOURCE_DIR}/docs/*.md)
+
+# law_install_document(<name> <package> <component>)
+# The links of a page lead to where the packages have what they lead to in the sources.
+function(law_install_document name package component)
+    set(directory ${CMAKE_INSTALL_DATADIR}/doc/${package})
     set(document ${PROJECT_SOURCE_DIR}/docs/${name})
     if(IS_DIRECTORY ${document})
         install(DIRECTORY ${document} DESTINATION ${directory} COMPONENT ${component})
-    else()
+        return()
+    elseif(NOT name MATCHES "\\.md$")
         install(FILES ${document} DESTINATION ${directory} COMPONENT ${component})
+        return()
     endif()
+    set_property(DIRECTORY APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS ${document})
+    file(READ ${document} text)
+    string(REPLACE "](../README.md" "](README.md" text "${text}")
+    foreach(other IN LISTS linked)
+        set(home lease-warranty-provider)
+        if(DEFINED package_of_${other})
+            set(home ${package_of_${other}})
+        endif()
+        if(NOT home STREQUAL package)
+            string(REPLACE "](${other}" "](../${home}/${other}" text "${text}")
+        endif()
+    endforeach()
+    cmake_path(GET document FILENAME name)
+    file(WRITE ${CMAKE_CURRENT_BINARY_DIR}/documents/${name} "${text}")
+    install(FILES ${CMAKE_CURRENT_BINARY_DIR}/documents/${name} DESTINATION ${directory} COMPONENT ${component})
 endfunction()
 
 # law_install_overrides(<component> <name>)
@@ -71,7 +110,8 @@ function(law_install_overrides component name)
 endfunction()
 
 law_package(provider lease-warranty-provider
-    DOCUMENTS classes classes.md data-files.md gate.md log-records.md messages.md object-managers.md
+    DOCUMENTS classes classes.md data-files.md gate.md log-records.md messages.md object-managers.md performance.md
+        performance.svg security.md ../README.md
     DEPENDS "ostrel-reference-agent (>= ${PROJECT_VERSION}) | ostrel-agent"
     DESCRIPTION "CMPI provider for the leases and warranties of a computer
 A library that a CIM object manager (SFCB, OpenPegasus) loads, and that

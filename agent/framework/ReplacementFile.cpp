@@ -19,11 +19,17 @@ namespace {
     throwFileError("Cannot write ", path, errno);
 }
 
+/** A name beside the file that nobody would give another, so that one left behind by a crash can be told. */
+std::string temporaryNameFor(const std::string& target) {
+    const std::size_t name = target.rfind('/') + 1;
+    return target.substr(0, name) + "." + target.substr(name) + ".new-XXXXXX";
+}
+
 /** A new file beside the one to be replaced; removed again unless it took its place. */
 class TemporaryFile {
 public:
     explicit TemporaryFile(const std::string& target)
-        : path(target + ".XXXXXX"), file(::mkostemp(path.data(), O_CLOEXEC)) {
+        : path(temporaryNameFor(target)), file(::mkostemp(path.data(), O_CLOEXEC)) {
         if (file.get() < 0) {
             path.clear();
             fail(target);

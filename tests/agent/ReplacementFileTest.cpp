@@ -3,10 +3,13 @@
 #include "Exceptions.h"
 #include "agent/TemporaryDirectory.h"
 
+#include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <sys/resource.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <csignal>
 #include <filesystem>
 
 using agent_test::TemporaryDirectory;
@@ -70,6 +73,20 @@ TEST(ReplacementFile, SaysWhyItCannotBeMade) {
     } catch (const KO::FrameworkException& failure) {
         EXPECT_EQ(failure.what(), "Cannot write " + directory.file("none/file") + ": No such file or directory");
     }
+}
+
+// What is left behind is deleted when the package is purged, and nothing else that lies there.
+TEST(ReplacementFile, HasANameUntilItTakesItsPlaceThatNobodyGivesAnother) {
+    const TemporaryDirectory directory;
+    const auto replaceAndBeKilled = [&] {
+        const struct rlimit nothing {};
+        ::setrlimit(RLIMIT_FSIZE, &nothing);
+        replaceFile(directory.file("asset.dat"), "new");
+    };
+    EXPECT_EXIT(replaceAndBeKilled(), testing::KilledBySignal(SIGXFSZ), "");
+    ASSERT_EQ(entriesOf(directory), 1U);
+    const std::string left = std::filesystem::directory_iterator(directory.path())->path().filename();
+    EXPECT_THAT(left, testing::MatchesRegex("\\.asset\\.dat\\.new-......"));
 }
 
 TEST(ReplacementFile, LeavesTheOldOneWhenItFails) {
