@@ -80,7 +80,7 @@ std::string formatMof(const Value& value) {
 }
 
 std::string formatMof(const Instance& instance) {
-    return instanceText(instance);
+    return wellFormed(instanceText(instance));
 }
 
 }  // namespace cimhost

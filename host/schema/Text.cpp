@@ -17,6 +17,42 @@ struct Escape {
 constexpr Escape escapes[] = {{'b', '\b'}, {'t', '\t'}, {'n', '\n'},  {'f', '\f'},
                               {'r', '\r'}, {'"', '"'},  {'\'', '\''}, {'\\', '\\'}};
 
+/** Characters in UTF-8 by their first byte: how many bytes they have, and from where to where the second may go. */
+struct Sequence {
+    unsigned char from;
+    unsigned char to;
+    std::size_t length;
+    unsigned char secondFrom;
+    unsigned char secondTo;
+};
+
+constexpr Sequence sequences[] = {
+    {0x00, 0x7F, 1, 0, 0},       {0xC2, 0xDF, 2, 0x80, 0xBF}, {0xE0, 0xE0, 3, 0xA0, 0xBF},
+    {0xE1, 0xEC, 3, 0x80, 0xBF}, {0xED, 0xED, 3, 0x80, 0x9F}, {0xEE, 0xEF, 3, 0x80, 0xBF},
+    {0xF0, 0xF0, 4, 0x90, 0xBF}, {0xF1, 0xF3, 4, 0x80, 0xBF}, {0xF4, 0xF4, 4, 0x80, 0x8F},
+};
+
+/** How many bytes at the front are a character, or as much of one as there is. */
+std::size_t charactersBytes(std::string_view text, bool& isWhole) {
+    const auto isWithin = [&](std::size_t index, unsigned char from, unsigned char to) {
+        const auto byte = static_cast<unsigned char>(text[index]);
+        return byte >= from && byte <= to;
+    };
+    isWhole = false;
+    for (const Sequence& sequence : sequences) {
+        if (isWithin(0, sequence.from, sequence.to)) {
+            std::size_t count = 1;
+            while (count < sequence.length && count < text.size() &&
+                   (count == 1 ? isWithin(1, sequence.secondFrom, sequence.secondTo) : isWithin(count, 0x80, 0xBF))) {
+                ++count;
+            }
+            isWhole = count == sequence.length;
+            return count;
+        }
+    }
+    return 1;
+}
+
 bool isHex(char c) {
     return (c >= '0' && c <= '9') || (c >= 'a' && c <= 'f') || (c >= 'A' && c <= 'F');
 }
@@ -104,6 +140,17 @@ std::string unescaped(std::string_view content) {
         text += c;
     }
     return text;
+}
+
+std::string wellFormed(std::string_view text) {
+    std::string result;
+    while (!text.empty()) {
+        bool isWhole = false;
+        const std::size_t bytes = charactersBytes(text, isWhole);
+        result += isWhole ? text.substr(0, bytes) : "\uFFFD";
+        text.remove_prefix(bytes);
+    }
+    return result;
 }
 
 void appendUtf8(std::string& text, std::uint32_t codePoint) {

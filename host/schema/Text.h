@@ -16,6 +16,9 @@ std::string inQuotes(std::string_view text);
  */
 std::string unescaped(std::string_view content);
 
+/** The text with a replacement character (U+FFFD) where its bytes are no UTF-8. */
+std::string wellFormed(std::string_view text);
+
 /** Adds the character in UTF-8. */
 void appendUtf8(std::string& text, std::uint32_t codePoint);
 
