@@ -163,9 +163,12 @@ bool showIn(const DataFile& file, const CMPIInstance* current, const Values& cha
 
 namespace {
 
-bool takeNothingAway(const Values& changes) {
-    return std::all_of(changes.begin(), changes.end(), [](const auto& change) {
-        return !change.second.empty() && !(change.first->type == CMPI_dateTime && change.second == noDate);
+/** Whether the value that a property had was one that the changes take away, which may stand behind two properties. */
+bool wasTakenAway(const std::string& text, const CMPIInstance* before, const Values& changes) {
+    return std::any_of(changes.begin(), changes.end(), [&](const auto& change) {
+        const bool isEmptied =
+            change.second.empty() || (change.first->type == CMPI_dateTime && change.second == noDate);
+        return isEmptied && propertyOf(before, *change.first) == text;
     });
 }
 
@@ -173,10 +176,10 @@ bool takeNothingAway(const Values& changes) {
 void requireNothingLost(const Class& owner, const CMPIInstance* before, const CMPIInstance* after,
                         const Values& changes) {
     for (const Property& property : owner) {
-        const auto textOf = [&](const CMPIInstance* instance) {
-            return stored(property, propertyOf(instance, property).value_or(std::string()));
-        };
-        if (!isAmong(property, changes) && textOf(after).empty() && !textOf(before).empty()) {
+        const std::string text = propertyOf(before, property).value_or(std::string());
+        const std::string now = propertyOf(after, property).value_or(std::string());
+        const bool isLost = stored(property, now).empty() && !stored(property, text).empty();
+        if (isLost && !isAmong(property, changes) && !wasTakenAway(text, before, changes)) {
             fail(CMPI_RC_ERR_FAILED, std::string(property.name) + " was lost: the data file could not be read.");
         }
     }
@@ -186,9 +189,7 @@ void requireNothingLost(const Class& owner, const CMPIInstance* before, const CM
 
 void requireChanged(const Class& owner, const DataFile& file, const CMPIInstance* before, const CMPIInstance* after,
                     const Values& changes) {
-    if (takeNothingAway(changes)) {  // one that is taken away may have stood behind two properties
-        requireNothingLost(owner, before, after, changes);
-    }
+    requireNothingLost(owner, before, after, changes);
     for (const auto& [property, text] : changes) {
         const auto now = propertyOf(after, *property);
         const bool isDate = property->type == CMPI_dateTime;

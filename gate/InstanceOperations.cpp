@@ -111,7 +111,7 @@ void orUndone(const Target& target, Change change, Undo undo) {
         if (!isUndoneBy(undo)) {
             failure.text += std::string(" ") + target.file.fileName;
             failure.text += target.file.keepsRecords() ? " stays damaged until the next change succeeds."
-                                                       : " is not what it was before.";
+                                                       : " may not be what it was before.";
         }
         throw;
     } catch (...) {
