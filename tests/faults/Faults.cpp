@@ -1,11 +1,17 @@
 #include "Faults.h"
 
+#include <gtest/gtest.h>
+
+#include <algorithm>
 #include <array>
 #include <cerrno>
 #include <cstdlib>
+#include <filesystem>
+#include <iterator>
 #include <new>
 #include <ostream>
 #include <system_error>
+#include <utility>
 
 #include "support/Recording.h"
 
@@ -13,16 +19,18 @@ namespace faults {
 
 namespace {
 
-constexpr std::array<const char*, operationKinds> names{
-    "allocation", "opening", "reading", "writing", "syncing",        "renaming",
-    "removing",   "closing", "asking",  "owning",  "path resolving",
+constexpr std::array<const char*, operationKinds + 1> names{
+    "allocation", "taking of memory", "opening", "reading", "writing", "seeking",        "syncing",
+    "renaming",   "removing",         "closing", "asking",  "owning",  "path resolving", "operation on files",
 };
 
 /** What this thread's faults are; nothing in here allocates. */
 struct State {
     bool armed = false;
     const Fault* fault = nullptr;
+    bool happened = false;
     std::array<int, operationKinds> counts{};
+    int onFiles = 0;  ///< all of them that are
 };
 
 thread_local State state;
@@ -34,22 +42,65 @@ void happen(const std::function<void()>& event) {
     state.armed = true;
 }
 
+OperationVerdict failed(int error) {
+    return {error, error == 0 ? 1 : 0};
+}
+
+/** The next operation of a kind. @return its number, as the fault counts them; 0 when it is none of the fault's */
+int numberForFault(OperationKind kind) {
+    const int number = ++state.counts[kind];
+    state.onFiles += isOnFiles(kind) ? 1 : 0;
+    if (state.fault == nullptr) {
+        return 0;
+    }
+    if (state.fault->kind == anyOnFiles) {
+        return isOnFiles(kind) ? state.onFiles : 0;
+    }
+    return state.fault->kind == kind ? number : 0;
+}
+
 OperationVerdict judge(OperationKind kind) {
     constexpr OperationVerdict done{0, 0};
     if (!state.armed || testsupport::insideBroker != 0) {
         return done;
     }
-    const int number = ++state.counts[kind];
+    const int number = numberForFault(kind);
     const Fault* fault = state.fault;
-    if (fault == nullptr || fault->kind != kind || number < fault->number ||
-        (number > fault->number && !fault->lasting)) {
+    if (fault != nullptr && state.happened && fault->then && fault->then->kind == kind) {
+        return failed(fault->then->error);
+    }
+    if (number == 0 || number < fault->number || (number > fault->number && !fault->lasting)) {
         return done;
     }
+    state.happened = true;
     if (fault->instead) {
         happen(fault->instead);
         return done;
     }
-    return {fault->error, fault->error == 0 ? 1 : 0};
+    return failed(fault->error);
+}
+
+/** Memory that is counted once, as an allocation. */
+void* take(std::size_t size) {
+    const bool wasArmed = std::exchange(state.armed, false);
+    void* memory = std::malloc(size);
+    state.armed = wasArmed;
+    return memory;
+}
+
+/** Libraries take long to load under a sanitizer. */
+int operationsInTime() {
+#ifdef LAW_SANITIZE
+    return 6;
+#else
+    return std::numeric_limits<int>::max();
+#endif
+}
+
+void tell(std::ostream& stream, int error) {
+    if (error != 0) {
+        stream << ": " << std::generic_category().message(error);
+    }
 }
 
 }  // namespace
@@ -58,16 +109,31 @@ const char* nameOf(OperationKind kind) {
     return names.at(kind);
 }
 
+bool isOnFiles(OperationKind kind) {
+    return kind != operationAllocate && kind != operationTakeMemory;
+}
+
+Counts onFiles(const Counts& counts) {
+    Counts some;
+    std::copy_if(counts.begin(), counts.end(), std::inserter(some, some.end()),
+                 [](const auto& each) { return isOnFiles(each.first) && each.second != 0; });
+    return some;
+}
+
 std::ostream& operator<<(std::ostream& stream, const Fault& fault) {
     stream << nameOf(fault.kind) << " number " << fault.number << (fault.lasting ? " and all after it" : "");
-    if (fault.error != 0) {
-        stream << ": " << std::generic_category().message(fault.error);
+    tell(stream, fault.error);
+    if (fault.then) {
+        stream << ", then each " << nameOf(fault.then->kind);
+        tell(stream, fault.then->error);
     }
     return stream;
 }
 
 void Armed::begin() {
     state.counts = {};
+    state.onFiles = 0;
+    state.happened = false;
     setOperationJudge(&judge);
     state.armed = true;
 }
@@ -97,8 +163,8 @@ Counts Armed::counts() const {
     return counts;
 }
 
-const std::vector<FileFailure>& fileFailures() {
-    static const std::vector<FileFailure> all{
+const std::vector<Failure>& fileFailures() {
+    static const std::vector<Failure> all{
         {operationOpen, EMFILE},   {operationOpen, EACCES},      {operationRead, EIO},       {operationRead, EINTR},
         {operationRead, 0},        {operationWrite, ENOSPC},     {operationWrite, EINTR},    {operationWrite, 0},
         {operationSync, EIO},      {operationRename, ENOSPC},    {operationRemove, EACCES},  {operationClose, EIO},
@@ -107,13 +173,46 @@ const std::vector<FileFailure>& fileFailures() {
     return all;
 }
 
+const std::vector<Failure>& memoryFailures() {
+    static const std::vector<Failure> all{{operationAllocate, 0}, {operationTakeMemory, ENOMEM}};
+    return all;
+}
+
+std::vector<Failure> allFailures() {
+    std::vector<Failure> all = fileFailures();
+    all.insert(all.end(), memoryFailures().begin(), memoryFailures().end());
+    return all;
+}
+
+void eachFault(const Counts& counts, const std::vector<Failure>& failures,
+               const std::function<void(const Fault&)>& body, const Extent& extent) {
+    const int most = extent.isKept ? extent.operations : std::min(extent.operations, operationsInTime());
+    for (const Failure& failure : failures) {
+        const int count = counts.at(failure.kind);
+        const int step = 1 + (count - 1) / most;
+        for (const bool lasting : {false, true}) {
+            const bool isLeftOut = lasting && (!extent.lasting || failure.error == EINTR);
+            for (int number = 1; !isLeftOut && number <= count && !testing::Test::HasFailure(); number += step) {
+                const Fault fault{failure.kind, number, lasting, failure.error};
+                SCOPED_TRACE(testing::PrintToString(fault));
+                body(fault);
+            }
+        }
+    }
+}
+
+int openDescriptors() {
+    const std::filesystem::directory_iterator entries("/proc/self/fd");
+    return static_cast<int>(std::distance(begin(entries), end(entries)));
+}
+
 }  // namespace faults
 
 // The libraries under test allocate with these too.
 
 void* operator new(std::size_t size) {
     const bool fails = faults::judge(operationAllocate).partly != 0;
-    if (void* memory = fails ? nullptr : std::malloc(size)) {
+    if (void* memory = fails ? nullptr : faults::take(size)) {
         return memory;
     }
     throw std::bad_alloc();

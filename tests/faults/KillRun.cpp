@@ -1,6 +1,7 @@
-// Kills processes that create, modify and delete, at random moments, and tells what is left of their files.
+// Kills processes that create, modify and delete, and tells what is left of their files.
 //
-// Usage: kill_run KILLS [SEED]
+// Usage: kill_run [--counted] KILLS [SEED]
+//   --counted  not at random moments, but after so many operations on files as the seed says: repeats exactly
 //
 // Ends with status 1 when a promise was broken: asset data are always whole, and those of the last modification that
 // was answered or of the one under way; and the next process serves.
@@ -13,7 +14,10 @@
 #include <cstdlib>
 #include <iostream>
 #include <random>
+#include <stdexcept>
+#include <string>
 #include <thread>
+#include <vector>
 
 #include "Killing.h"
 #include "support/Values.h"
@@ -26,7 +30,8 @@ using testsupport::text;
 using testsupport::uint32;
 
 constexpr int records = 10;
-constexpr int longestLife = 20000;  ///< microseconds after the first answer
+constexpr int longestLife = 20000;    ///< microseconds after the first answer
+constexpr int mostOperations = 4000;  ///< on files, of a process whose operations are counted
 
 /** The text that a step writes into two properties at once. */
 std::string textOf(int step) {
@@ -44,7 +49,7 @@ Request stepOf(int step) {
         made.instance = testsupport::instance(made.path, std::move(values));
         return made;
     };
-    const std::string number = std::to_string(2 + step / 4 % (records - 1));
+    const std::string number = std::to_string(3 + step / 4 % (records - 2));
     switch (step % 4) {
         case 0:
             return with("ModifyAsset", "",
@@ -76,7 +81,7 @@ struct Seen {
 
 class KillRun {
 public:
-    explicit KillRun(unsigned int seed) : random(seed) {}
+    KillRun(bool countsOperations, unsigned int seed) : isCounted(countsOperations), random(seed) {}
 
     void killOnce() {
         FileContents files = scene.filesAtFirst();
@@ -106,31 +111,39 @@ public:
     }
 
 private:
+    int upTo(int most) { return std::uniform_int_distribution<int>(0, most)(random); }
+
+    /** The load, which tells each step that was answered. Kills itself after some operations, if there are any. */
+    void work(int told, int operations) {
+        for (int step = 0;; ++step) {
+            const Fault killed{anyOnFiles, operations, false, 0, [] { std::raise(SIGKILL); }};
+            const Done done = scene.ask(stepOf(step), operations > 0 ? &killed : nullptr);
+            for (const auto& each : onFiles(done.counts)) {
+                operations -= each.second;
+            }
+            if (write(told, &step, sizeof step) != sizeof step) {
+                throw std::runtime_error("nobody listens");
+            }
+        }
+    }
+
     /** Runs the load in a process of its own until it is killed; the last step that was answered, -1 without one. */
     int answeredUntilKilled() {
         int pipe[2];
         if (::pipe(pipe) != 0) {
             throw std::runtime_error("no pipe");
         }
-        const int life = std::uniform_int_distribution<int>(0, longestLife)(random);
-        const pid_t child = fork();
-        if (child == 0) {
-            for (int step = 0;; ++step) {
-                scene.ask(stepOf(step));
-                if (write(pipe[1], &step, sizeof step) != sizeof step) {
-                    _exit(1);
-                }
-            }
-        }
+        const int operations = isCounted ? 1 + upTo(mostOperations) : 0;
+        const pid_t child = startProcess([&] { work(pipe[1], operations); });
         close(pipe[1]);
         int last = -1;
         int step = 0;
-        if (read(pipe[0], &step, sizeof step) == sizeof step) {
+        if (!isCounted && read(pipe[0], &step, sizeof step) == sizeof step) {
             last = step;
-            std::this_thread::sleep_for(std::chrono::microseconds(life));
+            std::this_thread::sleep_for(std::chrono::microseconds(upTo(longestLife)));
+            kill(child, SIGKILL);
         }
-        kill(child, SIGKILL);
-        waitForEnd(child);
+        require(waitForEnd(child), "the load came to an end");
         while (read(pipe[0], &step, sizeof step) == sizeof step) {
             last = step;
         }
@@ -140,8 +153,8 @@ private:
     }
 
     void lookAtAsset(const std::string& content, int answered) {
-        const int latest = answered - answered % 4;
-        bool found = false;
+        const int latest = std::max(0, answered - answered % 4);
+        bool found = answered < 0 && content == scene.filesAtFirst().at(assetFile);
         for (const int step : {latest, latest + 4}) {
             const std::string value = textOf(step) + "\n";
             found = found || (content.find("USER.AssetNumber=" + value) != std::string::npos &&
@@ -166,6 +179,7 @@ private:
     }
 
     Scene scene;
+    bool isCounted;
     std::mt19937 random;
     Seen leases;
     Seen warranties;
@@ -180,12 +194,15 @@ private:
 }  // namespace faults
 
 int main(int count, char** arguments) {
-    const int kills = count > 1 ? std::atoi(arguments[1]) : 0;
-    if (kills < 1 || count > 3) {
-        std::cerr << "Usage: kill_run KILLS [SEED]\n";
+    std::vector<std::string> words(arguments + 1, arguments + count);
+    const bool isCounted = !words.empty() && words.front() == "--counted";
+    words.erase(words.begin(), words.begin() + (isCounted ? 1 : 0));
+    const int kills = words.empty() ? 0 : std::atoi(words[0].c_str());
+    if (kills < 1 || words.size() > 2) {
+        std::cerr << "Usage: kill_run [--counted] KILLS [SEED]\n";
         return 2;
     }
-    faults::KillRun run(count > 2 ? static_cast<unsigned int>(std::atoi(arguments[2])) : 1);
+    faults::KillRun run(isCounted, words.size() > 1 ? static_cast<unsigned int>(std::atoi(words[1].c_str())) : 1);
     for (int kill = 0; kill < kills; ++kill) {
         run.killOnce();
     }

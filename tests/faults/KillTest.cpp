@@ -3,6 +3,7 @@
 
 #include <algorithm>
 #include <csignal>
+#include <stdexcept>
 
 #include "Killing.h"
 
@@ -59,8 +60,8 @@ TEST_P(KillTest, EveryPointLeavesAssetDataWholeAndOfRecordsTheBeginningInWholeLi
     restart();
     const Counts counts = scene.ask(request()).counts;
     whole = scene.files();
-    for (const auto& [kind, count] : counts) {
-        for (int number = 1; kind != operationAllocate && number <= count && !HasFailure(); ++number) {
+    for (const auto& [kind, count] : onFiles(counts)) {
+        for (int number = 1; number <= count && !HasFailure(); ++number) {
             SCOPED_TRACE(std::string("killed before ") + nameOf(kind) + " number " + std::to_string(number));
             killBefore(kind, number);
             FileContents left = scene.files();
@@ -79,6 +80,11 @@ TEST_P(KillTest, EveryPointLeavesAssetDataWholeAndOfRecordsTheBeginningInWholeLi
 
 INSTANTIATE_TEST_SUITE_P(Requests, KillTest, testing::ValuesIn(changingRequests()),
                          [](const auto& tested) { return tested.param.name; });
+
+TEST(ProcessTest, EndsWithItsWork) {
+    EXPECT_FALSE(isKilled([] {}));
+    EXPECT_THROW(isKilled([] { throw std::runtime_error("on the way"); }), std::runtime_error);
+}
 
 TEST(KillStateTest, TellsWholeFilesFromOthers) {
     EXPECT_EQ(stateOf(leaseRecords(3), linesOfLease), FileState::whole);

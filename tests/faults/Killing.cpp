@@ -31,6 +31,22 @@ int wholeRecordsIn(const std::string& content, int linesOfRecord) {
     return std::max(0, linesIn(content) - 1) / linesOfRecord;
 }
 
+pid_t startProcess(const std::function<void()>& work) {
+    const pid_t child = fork();
+    if (child < 0) {
+        throw std::runtime_error("no process can be started");
+    }
+    if (child == 0) {
+        try {
+            work();
+        } catch (...) {
+            _exit(1);
+        }
+        _exit(0);
+    }
+    return child;
+}
+
 bool waitForEnd(pid_t child) {
     int status = 0;
     if (waitpid(child, &status, 0) != child) {
@@ -46,12 +62,7 @@ bool waitForEnd(pid_t child) {
 }
 
 bool isKilled(const std::function<void()>& work) {
-    const pid_t child = fork();
-    if (child == 0) {
-        work();
-        _exit(0);
-    }
-    return waitForEnd(child);
+    return waitForEnd(startProcess(work));
 }
 
 }  // namespace faults

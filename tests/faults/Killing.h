@@ -21,6 +21,12 @@ int wholeRecordsIn(const std::string& content, int linesOfRecord);
 constexpr int linesOfLease = 13;
 constexpr int linesOfWarranty = 4;
 
+/**
+ * Runs work in a process of its own, which ends with it: with status 0, or 1 after an exception.
+ * @return the process, which has to be waited for; std::runtime_error when there can be no other process
+ */
+pid_t startProcess(const std::function<void()>& work);
+
 /** Waits for a child process. @return whether it was killed by SIGKILL; std::runtime_error after any other bad end */
 bool waitForEnd(pid_t child);
 

@@ -1,12 +1,10 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
-#include <sys/resource.h>
 
-#include <cerrno>
-#include <csignal>
 #include <filesystem>
 
 #include "Scene.h"
+#include "support/FullDisk.h"
 
 // A log that cannot be written costs its records, never a request.
 
@@ -51,22 +49,18 @@ TEST_F(LogFaultTest, AllThatFailsWithTheLogLeavesTheRequestServed) {
     const std::string before = scene.filesAtFirst().at(warrantyFile);
     const std::string after = scene.files().at(warrantyFile);
     ASSERT_GT(counts.at(operationRename), 0) << "the log is rotated";
-    std::vector<FileFailure> failures = fileFailures();
-    failures.push_back({operationAllocate, 0});
-    for (const FileFailure& failure : failures) {
-        const int count = counts.at(failure.kind);
-        const int step = 1 + count / 60;
-        for (int number = 1; number <= count; number += step) {
-            const Fault fault{failure.kind, number, false, failure.error, {}};
-            SCOPED_TRACE(testing::PrintToString(fault));
-            scene.restart();
-            const Done done = scene.ask(request, &fault);
-            EXPECT_EQ(done.outcome.rc, CMPI_RC_OK);
-            EXPECT_FALSE(done.outcome.threw);
-            scene.ask(repairOf(warrantyFile));
-            EXPECT_THAT(scene.files().at(warrantyFile), AnyOf(before, after));
-        }
-    }
+    const auto failOne = [&](const Fault& fault) {
+        scene.restart();
+        const int openBefore = openDescriptors();
+        const Done done = scene.ask(request, &fault);
+        EXPECT_EQ(done.outcome.rc, CMPI_RC_OK);
+        EXPECT_FALSE(done.outcome.threw);
+        scene.ask(repairOf(warrantyFile));
+        EXPECT_THAT(scene.files().at(warrantyFile), AnyOf(before, after));
+        scene.unload();
+        EXPECT_EQ(openDescriptors(), openBefore);
+    };
+    eachFault(counts, allFailures(), failOne, {true, 60});
 }
 
 TEST_F(LogFaultTest, ALogInADirectoryThatIsNotThereIsDoneWithout) {
@@ -84,14 +78,10 @@ TEST_F(LogFaultTest, ALogThatCannotGrowIsDoneWithout) {
     scene.configure("destination = \"" + log.string() + "\"\nlog_level = 9999\ntrace_level = 9999\n");
     testsupport::writeFile(log, "");
     fs::resize_file(log, full);
-    auto* const handler = std::signal(SIGXFSZ, SIG_IGN);
-    rlimit before{};
-    getrlimit(RLIMIT_FSIZE, &before);
-    const rlimit limit{full, before.rlim_max};
-    setrlimit(RLIMIT_FSIZE, &limit);
-    expectChangesAsWithout();
-    setrlimit(RLIMIT_FSIZE, &before);
-    std::signal(SIGXFSZ, handler);
+    {
+        const testsupport::FullDisk disk(full);
+        expectChangesAsWithout();
+    }
     EXPECT_EQ(fs::file_size(log), full);
 }
 

@@ -102,6 +102,19 @@ CMPIStatus remove(const Arguments& with) {
     return with.instances->ft->deleteInstance(with.instances, with.context, with.result, with.path);
 }
 
+CMPIStatus query(const Arguments& with) {
+    return with.instances->ft->execQuery(with.instances, with.context, with.result, with.path, "WQL",
+                                         "SELECT * FROM VELKO_Lease");
+}
+
+CMPIStatus cleanUp(const Arguments& with) {
+    return with.instances->ft->cleanup(with.instances, with.context, false);
+}
+
+CMPIStatus cleanUpAssociations(const Arguments& with) {
+    return with.associations->ft->cleanup(with.associations, with.context, false);
+}
+
 template <const char* const& association>
 CMPIStatus associators(const Arguments& with) {
     return with.associations->ft->associators(with.associations, with.context, with.result, with.path, association,
@@ -112,6 +125,18 @@ template <const char* const& association>
 CMPIStatus associatorNames(const Arguments& with) {
     return with.associations->ft->associatorNames(with.associations, with.context, with.result, with.path, association,
                                                   nullptr, nullptr, nullptr);
+}
+
+template <const char* const& association>
+CMPIStatus references(const Arguments& with) {
+    return with.associations->ft->references(with.associations, with.context, with.result, with.path, association,
+                                             nullptr, nullptr);
+}
+
+template <const char* const& association>
+CMPIStatus referenceNames(const Arguments& with) {
+    return with.associations->ft->referenceNames(with.associations, with.context, with.result, with.path, association,
+                                                 nullptr);
 }
 
 constexpr const char* leaseSetting = "VELKO_LeaseSetting";
@@ -130,17 +155,22 @@ Request changing(const char* name, const char* file, ObjectPath path, std::vecto
 }  // namespace
 
 const std::vector<Request>& allRequests() {
+    static const ObjectPath leaseOfComputer = identified("VELKO_Lease", "/system/computer");
+    static const ObjectPath warrantyOfComputer = identified("VELKO_Warranty", "/system/computer");
     static const std::vector<Request> all{
         changing("CreateLease", leaseFile, identified("VELKO_Lease", "lease that is new"), {}, &create),
-        changing("ModifyLease", leaseFile, identified("VELKO_Lease", "/system/computer"), leaseValues(), &modify),
-        changing("DeleteLease", leaseFile, identified("VELKO_Lease", "/system/computer"), {}, &remove),
+        changing("ModifyLease", leaseFile, leaseOfComputer, leaseValues(), &modify),
+        changing("EmptyLessor", leaseFile, leaseOfComputer, {named("Lessor", text(""))}, &modify),
+        changing("DeleteLease", leaseFile, leaseOfComputer, {}, &remove),
         changing("CreateWarranty", warrantyFile, identified("VELKO_Warranty", "warranty that is new"), {}, &create),
-        changing("ModifyWarranty", warrantyFile, identified("VELKO_Warranty", "/system/computer"), warrantyValues(),
-                 &modify),
-        changing("DeleteWarranty", warrantyFile, identified("VELKO_Warranty", "/system/computer"), {}, &remove),
+        changing("ModifyWarranty", warrantyFile, warrantyOfComputer, warrantyValues(), &modify),
+        changing("DeleteWarranty", warrantyFile, warrantyOfComputer, {}, &remove),
         changing("ModifyAsset", assetFile, assetPath(), assetValues(), &modify),
-        reading("GetLease", identified("VELKO_Lease", "/system/computer"), &get),
-        reading("GetWarranty", identified("VELKO_Warranty", "/system/computer"), &get),
+        changing("ModifyAssetNumber", assetFile, assetPath(), {named("AssetNumber", text("A-4711, another number"))},
+                 &modify),
+        changing("EmptyAssetNumber", assetFile, assetPath(), {named("AssetNumber", text(""))}, &modify),
+        reading("GetLease", leaseOfComputer, &get),
+        reading("GetWarranty", warrantyOfComputer, &get),
         reading("GetAsset", assetPath(), &get),
         reading("GetAgent", pathOf("VELKO_OstrelAgent", productKeys("ID-1", "Test Agent", "VEL")), &get),
         reading("NamesOfLeases", pathOf("VELKO_Lease"), &names),
@@ -159,7 +189,18 @@ const std::vector<Request>& allRequests() {
         reading("WarrantiesOfComputer", computer(), &associators<warrantySetting>),
         reading("NamesOfLeasesOfComputer", computer(), &associatorNames<leaseSetting>),
         reading("NamesOfWarrantiesOfComputer", computer(), &associatorNames<warrantySetting>),
-        reading("ComputersOfLease", identified("VELKO_Lease", "/system/computer"), &associators<leaseSetting>),
+        reading("ComputersOfLease", leaseOfComputer, &associators<leaseSetting>),
+        reading("ComputersOfWarranty", warrantyOfComputer, &associators<warrantySetting>),
+        reading("NamesOfComputersOfLease", leaseOfComputer, &associatorNames<leaseSetting>),
+        reading("NamesOfComputersOfWarranty", warrantyOfComputer, &associatorNames<warrantySetting>),
+        reading("LeaseSettingsOfComputer", computer(), &references<leaseSetting>),
+        reading("WarrantySettingsOfComputer", computer(), &references<warrantySetting>),
+        reading("NamesOfLeaseSettingsOfComputer", computer(), &referenceNames<leaseSetting>),
+        reading("NamesOfWarrantySettingsOfComputer", computer(), &referenceNames<warrantySetting>),
+        reading("UnknownInstances", pathOf("VELKO_Unknown"), &instances),
+        reading("Query", pathOf("VELKO_Lease"), &query),
+        reading("CleanUp", pathOf("VELKO_Lease"), &cleanUp),
+        reading("CleanUpAssociations", pathOf(leaseSetting), &cleanUpAssociations),
     };
     return all;
 }
@@ -185,12 +226,12 @@ const Request& requestNamed(const std::string& name) {
 
 namespace {
 
-/** A change of one value for each file. @param number of the record's term; that with which it is made is 2 */
+/** A change of one value for each file. @param number of the record's term; that with which it is made is 1 */
 std::map<std::string, Request> smallChanges(unsigned int number) {
     return {
-        {leaseFile, changing("repair", leaseFile, identified("VELKO_Lease", "lease number 2"),
+        {leaseFile, changing("repair", leaseFile, identified("VELKO_Lease", "lease number 1"),
                              {named("LeaseTerm", uint32(number))}, &modify)},
-        {warrantyFile, changing("repair", warrantyFile, identified("VELKO_Warranty", "warranty number 2"),
+        {warrantyFile, changing("repair", warrantyFile, identified("VELKO_Warranty", "warranty number 1"),
                                 {named("WarrantyDuration", uint32(number))}, &modify)},
         {assetFile, changing("repair", assetFile, assetPath(), {named("SystemLocation", text("repaired"))}, &modify)},
     };
@@ -199,7 +240,7 @@ std::map<std::string, Request> smallChanges(unsigned int number) {
 }  // namespace
 
 const Request& repairOf(const std::string& dataFile) {
-    static const std::map<std::string, Request> repairs = smallChanges(2);
+    static const std::map<std::string, Request> repairs = smallChanges(1);
     return repairs.at(dataFile);
 }
 

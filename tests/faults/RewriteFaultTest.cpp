@@ -3,9 +3,8 @@
 
 #include <algorithm>
 #include <cerrno>
-#include <filesystem>
-#include <sstream>
 
+#include "Killing.h"
 #include "Scene.h"
 
 // What a failure in the middle of a rewrite leaves of a file of records. docs/data-files.md gives these figures.
@@ -13,11 +12,7 @@
 namespace faults {
 namespace {
 
-namespace fs = std::filesystem;
-using testing::AnyOf;
-
 constexpr int leases = 10;
-constexpr int linesOfLease = 13;
 constexpr int writesOfRewrite = 1 + leases * linesOfLease;
 
 class RewriteFaultTest : public testing::Test {
@@ -39,7 +34,7 @@ protected:
     }
 
     static Fault writeFailing(int number, bool lasting, int error = ENOSPC) {
-        return {operationWrite, number, lasting, error, {}};
+        return {operationWrite, number, lasting, error};
     }
 
     std::string wholeFile() {
@@ -71,14 +66,6 @@ protected:
     Scene scene;
 };
 
-TEST_F(RewriteFaultTest, HandsEachLineToTheSystemInAWriteOfItsOwn) {
-    Counts counts = scene.ask(requestNamed("ModifyLease")).counts;
-    EXPECT_EQ(counts[operationWrite], writesOfRewrite);
-    EXPECT_EQ(counts[operationOpen], 1);
-    EXPECT_EQ(counts[operationClose], 1);
-    EXPECT_EQ(counts[operationSync], 0) << "nothing is forced to the disk";
-}
-
 TEST_F(RewriteFaultTest, ADiskThatIsFullFromALineOnKeepsTheLinesBeforeIt) {
     const std::string whole = wholeFile();
     for (int number = 1; number <= writesOfRewrite; ++number) {
@@ -108,7 +95,7 @@ TEST_F(RewriteFaultTest, LackOfMemoryKeepsTheFileAsItWasOrWritesItWhole) {
     Counts counts = scene.ask(requestNamed("ModifyLease")).counts;
     int written = 0;
     for (int number = 1; number <= counts[operationAllocate]; ++number) {
-        const std::string content = rewriteWith({operationAllocate, number, true, 0, {}});
+        const std::string content = rewriteWith({operationAllocate, number, true});
         EXPECT_EQ(std::count(content.begin(), content.end(), '\n'), writesOfRewrite);
         written += content == before ? 0 : 1;
     }
@@ -157,46 +144,25 @@ TEST_F(RewriteFaultTest, AFileWhoseCountIsPutRightLosesNoneOfItsWholeRecords) {
               std::to_string(intact) + firstLines(rest, 1 + intact * linesOfLease).substr(2));
 }
 
-/** The data directory goes while a request works. */
-class VanishingDirectoryTest : public testing::TestWithParam<Request> {
-protected:
-    void vanishAt(OperationKind kind, int number) {
-        const fs::path data = scene.dataDirectory();
-        const fs::path away = scene.directory() / "away";
-        scene.restart();
-        scene.library();
-        const Fault fault{kind, number, false, 0, [&] { fs::rename(data, away); }};
-        const Done done = scene.ask(GetParam(), &fault);
-        EXPECT_EQ(done.outcome.rc, CMPI_RC_OK);
-        EXPECT_FALSE(done.outcome.threw);
-        EXPECT_EQ(scene.ask(repairOf(GetParam().changes)).outcome.rc, CMPI_RC_OK) << "also while it is gone";
-        EXPECT_FALSE(fs::exists(data)) << "nobody makes it";
-        fs::rename(away, data);
-    }
+/** A rewrite of either class. */
+class OperationsOfRewriteTest : public testing::TestWithParam<const char*> {};
 
+TEST_P(OperationsOfRewriteTest, AreAnOpeningAWriteForEachLineAndAClosing) {
     Scene scene;
-};
-
-TEST_P(VanishingDirectoryTest, LeavesTheProviderAtWorkAndTheNextChangeStoresEverything) {
-    const std::string file = GetParam().changes;
-    scene.ask(GetParam());
-    Counts counts = scene.ask(GetParam()).counts;
-    scene.restart();
-    counts = scene.ask(GetParam()).counts;
-    for (const auto& [kind, count] : counts) {
-        for (int number = 1; kind != operationAllocate && number <= count; ++number) {
-            SCOPED_TRACE(std::string(nameOf(kind)) + " number " + std::to_string(number));
-            vanishAt(kind, number);
-            EXPECT_EQ(scene.ask(repairOf(file)).outcome.rc, CMPI_RC_OK);
-            const Lines kept = scene.instancesOf(classOf(file));
-            scene.unload();
-            EXPECT_EQ(scene.instancesOf(classOf(file)), kept);
-        }
-    }
+    const Request& request = requestNamed(GetParam());
+    FileContents files = scene.filesAtFirst();
+    files[leaseFile] = leaseRecords(leases);
+    files[warrantyFile] = warrantyRecords(leases);
+    scene.restart(files);
+    const Counts counts = scene.ask(request).counts;
+    const std::string content = scene.files().at(request.changes);
+    const int lines = static_cast<int>(std::count(content.begin(), content.end(), '\n'));
+    EXPECT_EQ(lines, 1 + leases * (request.changes == std::string(leaseFile) ? linesOfLease : linesOfWarranty));
+    EXPECT_EQ(onFiles(counts), (Counts{{operationOpen, 1}, {operationWrite, lines}, {operationClose, 1}}));
 }
 
-INSTANTIATE_TEST_SUITE_P(Requests, VanishingDirectoryTest, testing::ValuesIn(changingRequests()),
-                         [](const auto& tested) { return tested.param.name; });
+INSTANTIATE_TEST_SUITE_P(Classes, OperationsOfRewriteTest, testing::Values("ModifyLease", "ModifyWarranty"),
+                         [](const auto& tested) { return std::string(tested.param); });
 
 }  // namespace
 }  // namespace faults

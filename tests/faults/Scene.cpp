@@ -26,9 +26,9 @@ std::string repeated(int count, std::string (*record)(const std::string& number)
     return content;
 }
 
-/** The first record belongs to the agent's computer. */
+/** The second record belongs to the agent's computer. */
 std::string identifierOf(const std::string& kind, const std::string& number) {
-    return (number == "1" ? "/system/computer" : kind + "_number_" + number) + "\n";
+    return (number == "2" ? "/system/computer" : kind + "_number_" + number) + "\n";
 }
 
 std::string assetContent() {
@@ -85,6 +85,7 @@ Scene::Scene(Library itsLibrary)
       kind(itsLibrary) {
     keepOthersLoaded();
     configure({});
+    setAbsentDirectory("/var/lib/ostrel/");  // where the agent looks without a configuration
     setenv("OSTREL_CONFIG", configuration().c_str(), 1);
     const cimhost::ObjectPath computer = testsupport::objectPath(
         "root/cimv2", "VELKO_ComputerSystem", {testsupport::named("Name", testsupport::text("testhost"))});
@@ -98,7 +99,12 @@ Scene::~Scene() {
     unsetenv("OSTREL_CONFIG");
 }
 
-void Scene::configure(const std::string& log) {
+void Scene::configure(const std::string& log, System system) {
+    const std::string systemNode = R"([[instrumentation.node]]
+type = 1
+path = "/system"
+properties = { "36" = "Example Maker", "108" = "testhost" }
+)";
     testsupport::writeFile(configuration(), "[directories]\ninstall = \"" + directory().string() +
                                                 "/install\"\ndata = \"" + dataDirectory().string() + R"("
 [product]
@@ -111,10 +117,8 @@ vendor = "VEL"
 )" + log + R"(
 [instrumentation]
 discover = false
-[[instrumentation.node]]
-type = 1
-path = "/system"
-properties = { "36" = "Example Maker", "108" = "testhost" }
+)" + (system == System::told ? systemNode : std::string()) +
+                                                R"(
 [[instrumentation.node]]
 type = 40
 path = "/system/computer"
@@ -153,6 +157,7 @@ Done Scene::ask(const Request& request, const Fault* fault) {
     CMPIAssociationMI* associations = provider.associationMI();
     Done done;
     broker.forget();
+    const int openBefore = openDescriptors();
     done.outcome = provider.call([&](auto& scope, const CMPIContext* context, const CMPIResult* result) {
         const Arguments arguments{
             instances, associations, context, result, scope.objectPath(request.path), scope.instance(request.instance)};
@@ -161,6 +166,7 @@ Done Scene::ask(const Request& request, const Fault* fault) {
         done.counts = armed.counts();
         return status;
     });
+    done.leftOpen = openDescriptors() - openBefore;
     return done;
 }
 

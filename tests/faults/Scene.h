@@ -44,6 +44,7 @@ std::ostream& operator<<(std::ostream& stream, const Request& request);
 struct Done {
     testsupport::Outcome outcome;
     Counts counts;
+    int leftOpen = 0;  ///< how many more files this process had open after it than before
 };
 
 /** What clients see of a class's instances, a line a property. */
@@ -54,7 +55,8 @@ using FileContents = std::map<std::string, std::string>;
 
 /**
  * An agent with a data directory, and a library of the project in this process: the provider, or the gate over it. The
- * agent knows one computer, which has a lease, a warranty and asset data; there are more leases and warranties.
+ * agent knows one computer, which has a lease, a warranty and asset data. Its lease and its warranty are the second:
+ * who does not look at the key comes upon another one.
  */
 class Scene {
 public:
@@ -69,8 +71,14 @@ public:
     /** The same with these files in the data directory. */
     void restart(const FileContents& files);
 
-    /** Writes the agent's configuration: the table [log]'s lines, none for no log. Counts from the next loading. */
-    void configure(const std::string& log);
+    enum class System { told, untold };
+
+    /**
+     * Writes the agent's configuration, which counts from the next loading.
+     * @param log the table [log]'s lines, none for no log
+     * @param system whether the instrumentation tells of it beside the computer
+     */
+    void configure(const std::string& log, System system = System::told);
 
     testsupport::ProviderLibrary& library();
     void unload();
@@ -99,7 +107,7 @@ private:
 std::string fileOf(Scene::Library library);
 
 /** @name Requests
- * Those of the table are all that the provider serves, for every class.
+ * The table has every operation for every class that serves it, and some that none serves.
  */
 ///@{
 const std::vector<Request>& allRequests();
@@ -109,7 +117,7 @@ std::vector<Request> changingRequests();
 const Request& requestNamed(const std::string& name);
 
 /**
- * What comes after a failure and sets all right: a modification of the second record of a file of records, which gives
+ * What comes after a failure and sets all right: a modification of the first record of a file of records, which gives
  * it the value that it has, or of asset data.
  */
 const Request& repairOf(const std::string& dataFile);
@@ -121,7 +129,7 @@ const Request& detourOf(const std::string& dataFile);
 /** The class whose instances a data file keeps. */
 std::string classOf(const std::string& dataFile);
 
-/** A file of records: its count, then so many records, told apart by their numbers. */
+/** A file of records: its count, then so many records, told apart by their numbers, which are also their terms. */
 std::string leaseRecords(int count);
 std::string warrantyRecords(int count);
 

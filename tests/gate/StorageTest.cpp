@@ -1,13 +1,12 @@
 #include "GateFixture.h"
 
 #include "support/Files.h"
+#include "support/FullDisk.h"
 
 #include <dlfcn.h>
-#include <sys/resource.h>
 #include <sys/stat.h>
 #include <sys/statvfs.h>
 #include <cerrno>
-#include <csignal>
 #include <cstdio>
 #include <set>
 
@@ -20,29 +19,10 @@ namespace fs = std::filesystem;
 using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
+using testsupport::FullDisk;
 using testsupport::readFile;
 
 using StorageTest = GateTest;
-
-/** No file of this process can grow beyond a size while this lives, as if the disk were full. */
-class FullDisk {
-public:
-    explicit FullDisk(rlim_t size) : handler(std::signal(SIGXFSZ, SIG_IGN)) {
-        getrlimit(RLIMIT_FSIZE, &before);
-        const rlimit limit{size, before.rlim_max};
-        setrlimit(RLIMIT_FSIZE, &limit);
-    }
-    ~FullDisk() {
-        setrlimit(RLIMIT_FSIZE, &before);
-        std::signal(SIGXFSZ, handler);
-    }
-    FullDisk(const FullDisk&) = delete;
-    FullDisk& operator=(const FullDisk&) = delete;
-
-private:
-    rlimit before{};
-    void (*handler)(int);
-};
 
 /** While one of these lives, file systems say that they are full. */
 struct NoRoom {
