@@ -11,7 +11,7 @@ namespace cimhost::text {
 namespace {
 
 std::string_view variable(const char* name) {
-    const char* value = std::getenv(name);
+    const char* value = ::secure_getenv(name);
     return value == nullptr ? std::string_view() : std::string_view(value);
 }
 
