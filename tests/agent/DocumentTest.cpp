@@ -74,6 +74,21 @@ TEST(Document, RefusesATextThatGoesOnAfterABackslashWithACharacterOutsideOfAscii
     EXPECT_EQ(nameIn(document), std::nullopt);
 }
 
+TEST(Document, RefusesAnEscapeOutsideOfAscii) {
+    for (const char* text : {"name = \"\\\xC2\xA7\"\n", "name = \"\"\"\\\xC2\xA7\"\"\"\n", "name = \"x\\\xFF"}) {
+        const Document document = Document::parse(text, "agent.toml");
+        EXPECT_THAT(document.problem(), StartsWith("agent.toml is not valid TOML (line 1: a text that goes on"))
+            << text;
+        EXPECT_EQ(nameIn(document), std::nullopt) << text;
+    }
+}
+
+TEST(Document, MayHaveAnyCharacterBehindABackslashThatIsNoEscape) {
+    const Document document = Document::parse("name = '\\\xC3\xA4' # \\\xC3\xA4", "");
+    EXPECT_EQ(document.problem(), "");
+    EXPECT_EQ(nameIn(document), "\\\xC3\xA4");
+}
+
 TEST(Document, RefusesTablesThatAreNestedSoDeepThatAStackWouldNotHoldThem) {
     std::string parts = "a";
     std::string tables = "a = ";
