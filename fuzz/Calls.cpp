@@ -228,8 +228,8 @@ std::vector<const Writable*> someWritables(Bytes& bytes, const std::string& clas
     return some;
 }
 
-/** A call that can well succeed: of a class that keeps something, with a key or keys and values that fit. */
 void makeApt(Call& call, Bytes& bytes) {
+    call.isApt = true;
     constexpr std::array apt{"VELKO_Lease", "VELKO_Lease", "VELKO_Warranty", "VELKO_AssetIDDetails"};
     call.path = {"", "root/cimv2", bytes.pick(apt), {{"InstanceID", testsupport::text(aptText(bytes))}}};
     if (call.path.className == apt.back()) {

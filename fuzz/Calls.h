@@ -38,6 +38,7 @@ struct Call {
     cimhost::PropertyList properties{};
     std::optional<cimhost::Instance> instance{};
     cimhost::AssociationFilter filter{};
+    bool isApt = false;  ///< can well succeed: has a class that keeps something, all of its keys, and values that fit
 };
 
 /** The call as people read it. */

@@ -5,9 +5,12 @@
 #include "operations/Request.h"
 #include "schema/MofWriter.h"
 #include "schema/Names.h"
+#include "support/AssetModel.h"
 #include "support/Values.h"
 
 #include <algorithm>
+#include <iterator>
+#include <map>
 #include <string>
 
 // Sequences of calls through the gate's function tables: what is answered OK was done as the standard says and
@@ -28,10 +31,13 @@ namespace {
 
 using namespace fuzz;
 using cimhost::sameName;
+using testsupport::AssetField;
+using testsupport::AssetKind;
 using testsupport::Form;
 using testsupport::ModelRecord;
 using testsupport::RecordModel;
 using Records = std::vector<ModelRecord>;
+using AssetValues = std::map<std::string, std::string>;
 
 constexpr std::size_t mostCalls = 30;
 constexpr const char* identifierName = "InstanceID";
@@ -53,23 +59,34 @@ std::optional<std::string> given(const Call& call, const testsupport::ModelField
     }
 }
 
+/** What clients see of a value of the asset file. */
+std::string shownOf(const AssetField& field, const std::string& kept) {
+    const bool isEmpty = field.kind == AssetKind::personalized && kept == "Null";  // the provider's word for it
+    return isEmpty ? std::string() : kept;
+}
+
 /** The values of asset data, by the file's key; absent ones are empty. */
-std::vector<std::string> assetValues() {
-    static const char* const names[] = {"AssetNumber",     "AssetIdTag",   "Name",          "Phone",
-                                        "Position",        "Department",   "Location",      "ZOPMProfile",
-                                        "LastInventoried", "PurchaseDate", "ZOPMUpdateTime"};
+AssetValues assetValues() {
     const KO::PropertyText properties(dataFile("asset.dat").value_or(""));
-    std::vector<std::string> values;
-    for (const char* name : names) {
-        values.push_back(properties.get(std::string("USER.") + name).value_or(""));
-    }
-    for (const char* name : {"PersonalizedLabel", "PersonalizedData"}) {
-        for (char number = '1'; number <= '5'; ++number) {
-            const std::string value = properties.get(std::string("USER.") + name + number).value_or("");
-            values.push_back(value == "Null" ? "" : value);  // the provider's word for an empty one
-        }
+    AssetValues values;
+    for (const AssetField& field : testsupport::assetFields) {
+        values[field.key] = shownOf(field, properties.get(field.key).value_or(""));
     }
     return values;
+}
+
+/** A text without what an object manager may take off its ends: blanks, or also what is outside of ASCII. */
+std::string trimmed(const std::string& text, bool alsoOutsideAscii) {
+    const auto stays = [&](unsigned char each) { return each > ' ' && !(alsoOutsideAscii && each > 0x7F); };
+    const auto begin = std::find_if(text.begin(), text.end(), stays);
+    const auto end = std::find_if(text.rbegin(), std::make_reverse_iterator(begin), stays).base();
+    return {begin, end};
+}
+
+/** Whether a given text is the one that is there, as it comes back to the gate, and no change. */
+bool isSentBack(const Call& call, const std::string& text, const std::string& there) {
+    return !there.empty() &&
+           (trimmed(there, false) == text || (!call.properties.has_value() && trimmed(there, true) == text));
 }
 
 /** The records of a store. That there is no date is kept in two ways, of which clients see one. */
@@ -89,7 +106,7 @@ Records recordsOf(const Store& store) {
 struct Kept {
     Records leases = recordsOf(leaseStore());
     Records warranties = recordsOf(warrantyStore());
-    std::vector<std::string> asset = assetValues();
+    AssetValues asset = assetValues();
 
     const Records& of(const Store& store) const { return &store == &leaseStore() ? leases : warranties; }
 
@@ -97,6 +114,33 @@ struct Kept {
         return leases == other.leases && warranties == other.warranties && asset == other.asset;
     }
 };
+
+/** Whether what an apt call gives comes back: in records no text of one character does, in asset data no interval. */
+bool canBeKept(const Call& call, bool isRecord) {
+    const auto& values = call.instance->properties;
+    return std::all_of(values.begin(), values.end(), [&](const cimhost::NamedValue& each) {
+        const auto text = givenText(*call.instance, each.name.c_str());
+        return !text || (isRecord ? text->size() > 1 : text->find(':') == std::string::npos);
+    });
+}
+
+/** Whether nothing stands in the way of a call: what it is for is there, or not yet, and its values can be kept. */
+bool mustSucceed(const Call& call, const Kept& before) {
+    const Store* store = storeOf(call.path.className);
+    const bool isCreation = call.action == Action::createInstance;
+    const bool givesValues = isCreation || call.action == Action::modifyInstance;
+    if (!call.isApt || (givesValues && !canBeKept(call, store != nullptr))) {
+        return false;
+    }
+    if (store == nullptr) {
+        return !isCreation && call.action != Action::deleteInstance;
+    }
+    const Records& records = before.of(*store);
+    const bool isThere = std::any_of(records.begin(), records.end(), [&](const ModelRecord& record) {
+        return record.front() == keyText(call.path, identifierName);
+    });
+    return call.action <= Action::enumerateInstanceNames || isThere != isCreation;
+}
 
 void requireFileHolds(const Store& store, const Records& records) {
     RecordModel model(store.fields());
@@ -128,6 +172,7 @@ private:
         require(answer.doneCount() <= 1, "an answer is ended once at most");
         if (answer.status.rc != CMPI_RC_OK) {
             require(answer.events.empty(), "a failure gives no part of an answer");
+            require(!mustSucceed(call, before), "what can be done is done");
         }
         if (answer.status.rc == CMPI_RC_OK && isChange(call.action)) {
             requireChange(call, answer, before, after);
@@ -149,7 +194,7 @@ private:
         if (store == nullptr) {
             require(sameName(call.path.className, "VELKO_AssetIDDetails"), "only some classes can be changed");
             require(before.leases == after.leases && before.warranties == after.warranties, "records stay");
-            return requireAsset(call, after);
+            return requireAsset(call, before.asset, after.asset);
         }
         const Store& other = store == &leaseStore() ? warrantyStore() : leaseStore();
         require(before.of(other) == after.of(other) && before.asset == after.asset, "other classes stay");
@@ -208,14 +253,14 @@ private:
         require(after == expected, "the record, and nothing else, is deleted");
     }
 
-    static void requireAsset(const Call& call, const Kept& after) {
+    static void requireAsset(const Call& call, const AssetValues& before, const AssetValues& after) {
         require(call.action == Action::modifyInstance, "asset data can only be modified");
-        for (const char* property : {"AssetNumber", "SystemLocation", "PersonalizedData5", "PurchaseDate"}) {
-            const auto value = givenText(*call.instance, property);
-            const bool isKept = !value || !isListed(call, property) ||
-                                std::find(after.asset.begin(), after.asset.end(), *value) != after.asset.end() ||
-                                *value == "Null";
-            require(isKept, std::string(property) + " is stored");
+        for (const AssetField& field : testsupport::assetFields) {
+            const std::string& there = before.at(field.key);
+            const auto value = givenText(*call.instance, field.property);
+            const bool isChange = value && field.kind != AssetKind::readOnly && isListed(call, field.property) &&
+                                  !isSentBack(call, *value, there);
+            requireSame(after.at(field.key), isChange ? shownOf(field, field.kept(*value)) : there, field.key);
         }
     }
 

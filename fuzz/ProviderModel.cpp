@@ -4,7 +4,7 @@
 
 #include "framework/PropertyText.h"
 #include "schema/Names.h"
-#include "schema/Text.h"
+#include "support/AssetModel.h"
 
 #include <algorithm>
 #include <limits>
@@ -16,6 +16,7 @@ namespace {
 using cimhost::Instance;
 using cimhost::NamedValue;
 using cimhost::Value;
+using testsupport::AssetKind;
 using testsupport::Form;
 using testsupport::ModelRecord;
 
@@ -43,30 +44,6 @@ struct AsNumber {
         }
     }
 };
-
-/** A date as asset data keep it: none but a valid point in time without asterisks. */
-std::string keptDate(const std::string& text) {
-    const bool isPointInTime = cimhost::isDateTime(text) && text[21] != ':' && text.find('*') == std::string::npos;
-    return isPointInTime ? text : std::string();
-}
-
-struct Kept {
-    const char* key;
-    const char* property;
-};
-
-constexpr Kept assetTexts[] = {{"USER.AssetNumber", "AssetNumber"},
-                               {"USER.Name", "PrimaryOwnerName"},
-                               {"USER.Phone", "PrimaryOwnerPhone"},
-                               {"USER.Position", "PrimaryOwnerPosition"},
-                               {"USER.Department", "PrimaryOwnerDepartment"},
-                               {"USER.Location", "SystemLocation"},
-                               {"USER.ZOPMProfile", "ZOPMProfile"}};
-constexpr Kept assetDates[] = {{"USER.LastInventoried", "LastInventoried"},
-                               {"USER.PurchaseDate", "PurchaseDate"},
-                               {"USER.ZOPMUpdateTime", "ZOPMUpdateTime"}};
-constexpr const char* assetPairs[] = {"PersonalizedLabel", "PersonalizedData"};
-constexpr std::size_t assetKeys = 21;
 
 struct AssetKey {
     const char* name;
@@ -215,39 +192,18 @@ void RecordSide::requireAgreement() const {
     require(store.count() == model.records.size(), std::string(store.className) + ": the count is the records'");
 }
 
-void AssetSide::set(const char* key, const Instance& instance, const char* property) {
-    if (const auto text = givenText(instance, property)) {
-        values[key] = *text;
-    }
-}
-
-void AssetSide::setDate(const char* key, const Instance& instance, const char* property) {
-    if (const auto text = givenText(instance, property)) {
-        values[key] = keptDate(*text);
-    }
-}
-
 void AssetSide::modify(const Instance& instance) {
-    for (const Kept& kept : assetTexts) {
-        set(kept.key, instance, kept.property);
-    }
-    for (const Kept& kept : assetDates) {
-        setDate(kept.key, instance, kept.property);
-    }
-    for (const char* name : assetPairs) {
-        std::string repeated;
-        for (char number = '1'; number <= '5'; ++number) {
-            const std::string property = std::string(name) + number;
-            repeated = givenText(instance, property.c_str()).value_or(repeated);
-            values["USER." + property] = repeated;
+    std::string before;  // the personalized value before, which the next repeats where it is not given
+    for (const testsupport::AssetField& field : testsupport::assetFields) {
+        const auto given = givenText(instance, field.property);
+        if (field.kind == AssetKind::personalized) {
+            before = given.value_or(field.isFirst() ? std::string() : before);
+            values[field.key] = before;
+        } else if (given && field.kind != AssetKind::readOnly) {
+            values[field.key] = field.kept(*given);
+        } else {
+            values.emplace(field.key, "");
         }
-    }
-    values.emplace("USER.AssetIdTag", "");
-    for (const Kept& kept : assetTexts) {
-        values.emplace(kept.key, "");
-    }
-    for (const Kept& kept : assetDates) {
-        values.emplace(kept.key, "");
     }
 }
 
@@ -276,7 +232,7 @@ void AssetSide::requireAgreement() const {
     }
     const std::string text = content.value_or("");
     const auto lines = static_cast<std::size_t>(std::count(text.begin(), text.end(), '\n'));
-    requireSame(lines, values.empty() ? std::size_t{0} : assetKeys, "lines of asset.dat");
+    requireSame(lines, values.empty() ? std::size_t{0} : testsupport::assetFields.size(), "lines of asset.dat");
 }
 
 }  // namespace fuzz

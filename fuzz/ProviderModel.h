@@ -70,8 +70,6 @@ public:
 
 private:
     void modify(const cimhost::Instance& instance);
-    void set(const char* key, const cimhost::Instance& instance, const char* property);
-    void setDate(const char* key, const cimhost::Instance& instance, const char* property);
 
     bool exists = false;
     std::map<std::string, std::string> values{};  ///< by the file's key

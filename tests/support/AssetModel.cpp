@@ -1,0 +1,36 @@
+#include "support/AssetModel.h"
+
+#include "schema/Text.h"
+
+namespace testsupport {
+
+const std::array<AssetField, 21> assetFields{{
+    {"USER.AssetNumber", "AssetNumber", AssetKind::text},
+    {"USER.AssetIdTag", "AssetIdTag", AssetKind::readOnly},
+    {"USER.Name", "PrimaryOwnerName", AssetKind::text},
+    {"USER.Phone", "PrimaryOwnerPhone", AssetKind::text},
+    {"USER.Position", "PrimaryOwnerPosition", AssetKind::text},
+    {"USER.Department", "PrimaryOwnerDepartment", AssetKind::text},
+    {"USER.Location", "SystemLocation", AssetKind::text},
+    {"USER.ZOPMProfile", "ZOPMProfile", AssetKind::text},
+    {"USER.LastInventoried", "LastInventoried", AssetKind::date},
+    {"USER.PurchaseDate", "PurchaseDate", AssetKind::date},
+    {"USER.ZOPMUpdateTime", "ZOPMUpdateTime", AssetKind::date},
+    {"USER.PersonalizedLabel1", "PersonalizedLabel1", AssetKind::personalized},
+    {"USER.PersonalizedLabel2", "PersonalizedLabel2", AssetKind::personalized},
+    {"USER.PersonalizedLabel3", "PersonalizedLabel3", AssetKind::personalized},
+    {"USER.PersonalizedLabel4", "PersonalizedLabel4", AssetKind::personalized},
+    {"USER.PersonalizedLabel5", "PersonalizedLabel5", AssetKind::personalized},
+    {"USER.PersonalizedData1", "PersonalizedData1", AssetKind::personalized},
+    {"USER.PersonalizedData2", "PersonalizedData2", AssetKind::personalized},
+    {"USER.PersonalizedData3", "PersonalizedData3", AssetKind::personalized},
+    {"USER.PersonalizedData4", "PersonalizedData4", AssetKind::personalized},
+    {"USER.PersonalizedData5", "PersonalizedData5", AssetKind::personalized},
+}};
+
+std::string AssetField::kept(const std::string& given) const {
+    const bool isPointInTime = cimhost::isDateTime(given) && given[21] != ':' && given.find('*') == std::string::npos;
+    return kind != AssetKind::date || isPointInTime ? given : std::string();
+}
+
+}  // namespace testsupport
