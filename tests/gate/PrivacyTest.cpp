@@ -1,4 +1,7 @@
+#include "FullDisk.h"
 #include "GateFixture.h"
+
+#include "support/Files.h"
 
 // What a client is told when its request is refused is about its request, and nobody else's.
 
@@ -7,37 +10,94 @@ namespace {
 
 using testing::HasSubstr;
 using testing::Not;
+using Outcomes = std::vector<Outcome>;
 
+/** Of the two clients, the first has stored texts with its name in them wherever a client can. */
 class PrivacyTest : public GateTest {
 protected:
-    /** Requests that are refused, all with a client's own texts. */
-    std::vector<Outcome> refusalsOf(const std::string& client) {
-        const std::string mine = client + "-lease";
-        return {
-            create(mine, {named("Lessor", text(client + "_of_the_file"))}),
-            create("shared", {named("Lessor", text(client + " the second"))}),
-            modify(mine, {named("Lessor", text(client + " Leasing"))}),
-            modify("shared", {named("BaseRent", text(client + "\tmoney"))}),
-            modify("shared", {named("LeaseTerm", text(client))}),
-            modify("shared", {named("ElementName", text(client))}),
-            remove(mine),
-            gate().getInstance(keyedPath(warranty, client)),
-            create("", {named("Lessor", text(client))}),
-        };
-    }
-};
+    static constexpr const char* first = "alice-with-a-name-of-some-length";
+    static constexpr const char* second = "bob";
 
-TEST_F(PrivacyTest, ARefusalTellsNothingOfAnotherClientsRequests) {
-    ASSERT_THAT(create("shared"), isAnswered(1));
-    for (const auto& [first, second] : {std::pair{"alice", "bob"}, {"a-client-with-a-longer-name", "carol"}}) {
-        refusalsOf(first);
-        for (const Outcome& refusal : refusalsOf(second)) {
-            EXPECT_NE(refusal.rc, CMPI_RC_OK) << refusal.message;
-            EXPECT_TRUE(refusal.hasMessage);
+    PrivacyTest() {
+        const std::string name = first;
+        EXPECT_THAT(create(ofFirst, {named("Lessor", text(name + " Leasing")), named("BaseRent", text("1 " + name))}),
+                    isAnswered(1));
+        EXPECT_THAT(create(ofFirst, {named("Warrantor", text(name + " Services"))}, warranty), isAnswered(1));
+        EXPECT_THAT(modifyAsset({named("PrimaryOwnerName", text(name)), named("AssetNumber", text("A-1 " + name)),
+                                 named("PersonalizedLabel1", text("Room of " + name)),
+                                 named("PersonalizedData1", text(name + "'s"))}),
+                    isDone());
+        EXPECT_THAT(create("shared", {named("FairMarketValue", text("for " + name))}), isAnswered(1));
+    }
+
+    Outcome modifyAsset(std::vector<NamedValue> properties) {
+        const auto paths = gate().enumerateInstanceNames(classPath(asset)).paths();
+        const ObjectPath path = paths.empty() ? classPath(asset) : paths.front();
+        return gate().modifyInstance(path, testsupport::instance(path, std::move(properties)));
+    }
+
+    /** That each was refused, with words, and that these tell nothing of the first client but its lease's identifier.
+     */
+    static void expectNothingOfFirst(const Outcomes& refusals) {
+        for (const Outcome& refusal : refusals) {
+            EXPECT_NE(refusal.rc, CMPI_RC_OK);
+            EXPECT_TRUE(refusal.hasMessage) << refusal.rc;
+            EXPECT_NE(refusal.message, "");
             EXPECT_THAT(refusal.message, Not(HasSubstr(first)));
-            EXPECT_THAT(refusal.message, Not(HasSubstr(std::string(first).substr(1))));
+            EXPECT_THAT(refusal.message, Not(HasSubstr(std::string(first).substr(1)))) << "the rest of a text";
         }
     }
+
+    const std::string ofFirst = "lease-of-a";  ///< an identifier that the second client may know
+};
+
+TEST_F(PrivacyTest, ARefusalTellsNothingOfWhatAnotherClientHasStored) {
+    const std::string mine = std::string(second) + "-lease";
+    const NamedValue lossy = named("Lessor", text(std::string(second) + "_of_the_file"));
+    expectNothingOfFirst({
+        create(mine, {lossy}),
+        create("shared", {named("Lessor", text("the second"))}),
+        create(ofFirst),
+        create(ofFirst, {}, warranty),
+        create("", {named("Lessor", text(second))}),
+        modify(mine, {named("Lessor", text("Leasing"))}),
+        modify(ofFirst, {lossy}),
+        modify(ofFirst, {named("LeaseTerm", text(second))}),
+        modify(ofFirst, {named("ElementName", text(second))}),
+        modify("shared", {named("BaseRent", text(std::string(second) + "\tmoney"))}),
+        remove(mine),
+        gate().getInstance(keyedPath(warranty, second)),
+    });
+}
+
+TEST_F(PrivacyTest, NorDoesOneOfAssetData) {
+    expectNothingOfFirst({
+        modifyAsset({named("AssetIdTag", text(second))}),
+        modifyAsset({named("PurchaseDate", text("yesterday"))}),
+        modifyAsset({named("PersonalizedLabel1", uint32(1))}),
+        modifyAsset({named("NoSuchProperty", text(second))}),
+        create(second, {}, asset),
+        remove(second, asset),
+    });
+}
+
+TEST_F(PrivacyTest, NorDoesOneForWantOfRoomOnTheDisk) {
+    const std::string leases = testsupport::readFile(dataFile("Lease.dat"));
+    const NamedValue large = named("Lessor", text(std::string(1000, 'x')));
+    {
+        const FullDisk disk(leases.size() + 10);
+        expectNothingOfFirst({create(second), create(second, {large}), modify(ofFirst, {large})});
+    }
+    const FullDisk disk(leases.size() / 2);  // not even what was there has room
+    expectNothingOfFirst({modify("shared", {large}), remove("shared")});
+    const FullDisk none(1);
+    expectNothingOfFirst({modifyAsset({named("AssetNumber", text(second))})});
+}
+
+TEST_F(PrivacyTest, NorDoesOneForWantOfTheDataDirectory) {
+    std::filesystem::remove_all(agentEnvironment::dataDirectory());
+    expectNothingOfFirst(
+        {create(second), modify(ofFirst, {named("LeaseTerm", uint32(1))}), remove(ofFirst), remove(ofFirst, warranty)});
 }
 
 }  // namespace

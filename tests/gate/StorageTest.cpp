@@ -1,3 +1,4 @@
+#include "FullDisk.h"
 #include "GateFixture.h"
 
 #include "support/Files.h"
