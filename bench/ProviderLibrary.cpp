@@ -77,4 +77,8 @@ ProviderLibrary::ProviderLibrary(const Entrance& entrance, const CMPIBroker* bro
 
 AgentLibraries::AgentLibraries() : logging(BENCH_LOGGING_LIBRARY), framework(BENCH_FRAMEWORK_LIBRARY) {}
 
+std::array<std::filesystem::path, 2> AgentLibraries::files() {
+    return {BENCH_LOGGING_LIBRARY, BENCH_FRAMEWORK_LIBRARY};
+}
+
 }  // namespace bench

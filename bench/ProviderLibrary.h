@@ -2,6 +2,7 @@
 
 #include "Requests.h"
 
+#include <array>
 #include <filesystem>
 #include <string>
 
@@ -52,6 +53,9 @@ private:
 class AgentLibraries {
 public:
     AgentLibraries();
+
+    /** Where they are. */
+    static std::array<std::filesystem::path, 2> files();
 
 private:
     SharedLibrary logging;

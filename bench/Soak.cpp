@@ -1,8 +1,12 @@
 #include "Soak.h"
 
+#include "schema/ObjectPathText.h"
+
 #include <algorithm>
 #include <stdexcept>
 #include <string>
+#include <utility>
+#include <variant>
 
 namespace bench {
 
@@ -15,8 +19,9 @@ constexpr std::size_t changeEvery = 5;
 constexpr std::size_t deletionEvery = 200;
 constexpr std::size_t assetChangeEvery = 2000;  // each waits for the disk
 
-cimhost::ObjectPath leasePath(const std::string& id) {
-    cimhost::ObjectPath path = classPath(LeaseRow::className);
+template <class Row>
+cimhost::ObjectPath recordPath(const std::string& id) {
+    cimhost::ObjectPath path = classPath(Row::className);
     path.keys.push_back(textValue("InstanceID", id));
     return path;
 }
@@ -30,32 +35,21 @@ cimhost::ObjectPath assetPath() {
     return path;
 }
 
-std::vector<Request> allReads() {
-    cimhost::ObjectPath computer = classPath("VELKO_ComputerSystem");
-    computer.keys.push_back(textValue("Name", names::computer));
-    std::vector<Request> reads{associators(computer, 1), associatorNames(computer, 1), getInstance(assetPath()),
-                               getInstance(leasePath("no such lease"))};
-    for (const char* className : {LeaseRow::className, WarrantyRow::className, AgentRow::className, AssetRow::className,
-                                  "VELKO_LeaseSetting", "VELKO_WarrantySetting"}) {
-        reads.push_back(enumInstances(className, 0));
-        reads.push_back(enumInstanceNames(className, 0));
-    }
-    for (std::size_t index = 0; index < records; ++index) {
-        reads.push_back(getInstance(leasePath(instanceIdOf(index, records))));
-    }
-    return reads;
-}
+/** The class of an association or of instances, and how many there are to enumerate. */
+struct Population {
+    const char* className;
+    std::size_t alone;
+    std::size_t gated;  ///< the gate tells the associations that there are, not all pairs
+};
 
-std::vector<Request> allChanges() {
-    std::vector<Request> changes;
-    for (const char* lessor : {"ACME", "A Lessor With A Name That Does Not Fit Into A Small String", ""}) {
-        for (std::size_t index = 0; index < records; ++index) {
-            changes.push_back(
-                modifyInstance(leasePath(instanceIdOf(index, records)), textValue(LeaseRow::modified.name, lessor)));
-        }
-    }
-    return changes;
-}
+constexpr Population populations[] = {
+    {LeaseRow::className, records, records},
+    {WarrantyRow::className, records, records},
+    {AgentRow::className, 1, 1},
+    {AssetRow::className, 1, 1},
+    {"VELKO_LeaseSetting", records, 1},
+    {"VELKO_WarrantySetting", records, 1},
+};
 
 /** Calls step so many times, and progress after each tenth of them. */
 template <class Step>
@@ -70,31 +64,75 @@ void inTenths(std::size_t count, const Progress& progress, Step step) {
 
 }  // namespace
 
+Soak::Questions Soak::allReads(bool gated) {
+    cimhost::ObjectPath computer = classPath("VELKO_ComputerSystem");
+    computer.keys.push_back(textValue("Name", names::computer));
+    Questions reads{{associators(computer, 1)}, {associatorNames(computer, 1)}, {getInstance(assetPath())}};
+    Request missing = getInstance(recordPath<LeaseRow>("no such lease"));
+    missing.answers = 0;
+    missing.ends = !gated;
+    reads.push_back({std::move(missing), gated ? CMPI_RC_ERR_NOT_FOUND : CMPI_RC_OK});
+    for (const Population& each : populations) {
+        const std::size_t answers = gated ? each.gated : each.alone;
+        reads.push_back({enumInstances(each.className, answers)});
+        reads.push_back({enumInstanceNames(each.className, answers)});
+    }
+    for (std::size_t index = 0; index < records; ++index) {
+        reads.push_back({getInstance(recordPath<LeaseRow>(instanceIdOf(index, records)))});
+        reads.push_back({getInstance(recordPath<WarrantyRow>(instanceIdOf(index, records)))});
+    }
+    return reads;
+}
+
+Soak::Questions Soak::allChanges() {
+    Questions changes;
+    for (const char* party : {"ACME", "A Party With A Name That Does Not Fit Into A Small String", ""}) {
+        for (std::size_t index = 0; index < records; ++index) {
+            const std::string id = instanceIdOf(index, records);
+            changes.push_back({modifyInstance(recordPath<LeaseRow>(id), textValue(LeaseRow::modified.name, party))});
+            changes.push_back(
+                {modifyInstance(recordPath<WarrantyRow>(id), textValue(WarrantyRow::modified.name, party))});
+        }
+    }
+    return changes;
+}
+
+Soak::Questions Soak::allCreations() {
+    return {{createInstance(recordPath<LeaseRow>("for a moment"))},
+            {createInstance(recordPath<WarrantyRow>("for a moment"))}};
+}
+
 Soak::Soak(Workbench& workbench, bool behindGate)
     : bench(workbench),
       gated(behindGate),
-      reads(allReads()),
+      reads(allReads(behindGate)),
       changes(allChanges()),
-      assetChange(modifyInstance(assetPath(), textValue("AssetNumber", "A-4711"))) {}
+      creations(allCreations()),
+      assetChange{modifyInstance(assetPath(), textValue("AssetNumber", "A-4711"))} {}
 
 Interfaces Soak::load() {
-    bench.unload();
-    return gated ? bench.loadedTwice<LeaseRow>(records).second : bench.loaded<LeaseRow>(records);
+    return bench.loadBoth(records, gated ? Entrance::gate() : Entrance::provided());
 }
 
-void Soak::perform(const Request& request, const Interfaces& interfaces) {
-    const Outcome outcome = bench::perform(bench.broker(), request, interfaces);
-    const bool mayBeMissing = gated && outcome.status.rc == CMPI_RC_ERR_NOT_FOUND;
-    const bool mayBeUnsupported = gated && outcome.status.rc == CMPI_RC_ERR_NOT_SUPPORTED;
-    if (outcome.status.rc != CMPI_RC_OK && !mayBeMissing && !mayBeUnsupported) {
-        throw std::runtime_error("status " + std::to_string(outcome.status.rc) + ": " + outcome.status.message);
+void Soak::perform(const Question& question, const Interfaces& interfaces) {
+    const Outcome outcome = bench::perform(bench.broker(), question.request, interfaces);
+    const auto isEnd = [](const cimhost::ResultEvent& event) { return std::holds_alternative<cimhost::Done>(event); };
+    const auto ends = std::count_if(outcome.events.begin(), outcome.events.end(), isEnd);
+    const std::size_t answers = outcome.events.size() - static_cast<std::size_t>(ends);
+    const bool isEnded = !outcome.events.empty() && isEnd(outcome.events.back());
+    if (outcome.status.rc != question.rc || answers != question.request.answers ||
+        (question.request.ends && !isEnded)) {
+        throw std::runtime_error(cimhost::formatObjectPath(question.request.path) + ": status " +
+                                 std::to_string(outcome.status.rc) + ", not " + std::to_string(question.rc) + "; " +
+                                 std::to_string(answers) + " answers, not " + std::to_string(question.request.answers) +
+                                 (isEnded ? "; ended. " : "; not ended. ") + outcome.status.message);
     }
 }
 
-void Soak::createAndDelete(const Interfaces& interfaces) {
-    const cimhost::ObjectPath path = leasePath("for a moment");
-    perform(createInstance(path), interfaces);
-    perform(deleteInstance(path), interfaces);
+void Soak::createAndDelete(std::size_t number, const Interfaces& interfaces) {
+    const Question& creation = creations[number % creations.size()];
+    perform(creation, interfaces);
+    perform({deleteInstance(creation.request.path)}, interfaces);
     ++deleted;
 }
 
@@ -103,7 +141,7 @@ void Soak::performOne(const Interfaces& interfaces) {
     if (number % assetChangeEvery == 0) {
         perform(assetChange, interfaces);
     } else if (number % deletionEvery == 0) {
-        createAndDelete(interfaces);
+        createAndDelete(number / deletionEvery, interfaces);
     } else if (number % changeEvery == 0) {
         perform(changes[number / changeEvery % changes.size()], interfaces);
     } else {
@@ -124,7 +162,8 @@ void Soak::cycle(std::size_t count, const Progress& progress) {
         for (int use = 0; use < uses; ++use) {
             performOne(interfaces);
         }
-        createAndDelete(interfaces);
+        createAndDelete(0, interfaces);
+        createAndDelete(1, interfaces);
         bench.unload();
     });
 }

@@ -33,12 +33,33 @@ cimhost::Answer<std::vector<cimhost::Instance>> ComputerSystems::enumerateInstan
     return {{}, std::move(instances)};
 }
 
+Workbench::Workbench(AgentStays agentStays) {
+    if (agentStays == AgentStays::yes) {
+        agentLibraries.emplace();
+    }
+}
+
+Interfaces Workbench::loadBoth(std::size_t size, const Entrance& entrance) {
+    unload();
+    writeRows(directory.data() / LeaseRow::fileName, makeRows<LeaseRow>(size));
+    writeRows(directory.data() / WarrantyRow::fileName, makeRows<WarrantyRow>(size));
+    provider.emplace(entrance, objectManager.handle());
+    return provider->interfaces();
+}
+
 void Workbench::unload() {
     provider.reset();
     gate.reset();
     content.clear();
-    if (SharedLibrary::isLoaded(Entrance::provided().file)) {
-        throw std::runtime_error("the provider library stays in the process");
+    std::vector<std::filesystem::path> gone{Entrance::provided().file, Entrance::gate().file};
+    if (!agentLibraries) {
+        const auto agents = AgentLibraries::files();
+        gone.insert(gone.end(), agents.begin(), agents.end());
+    }
+    for (const std::filesystem::path& file : gone) {
+        if (SharedLibrary::isLoaded(file)) {
+            throw std::runtime_error(file.string() + " stays in the process");
+        }
     }
     directory.removeRecords();
 }

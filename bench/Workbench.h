@@ -26,9 +26,14 @@ public:
                                                                        const cimhost::PropertyList& list) override;
 };
 
+/** Whether the agent's libraries stay in the process when the provider goes. */
+enum class AgentStays { yes, no };
+
 /** Where all benchmarks are run: an agent, the object manager's broker and, loaded on demand, the provider. */
 class Workbench {
 public:
+    explicit Workbench(AgentStays agentStays = AgentStays::yes);
+
     cimhost::Broker& broker() { return objectManager; }
     ComputerSystems& computers() { return upCalls; }
     const AgentDirectory& agent() const { return directory; }
@@ -67,12 +72,18 @@ public:
         return {provider->interfaces(), gate->interfaces()};
     }
 
-    /** Takes the provider out of the process and its records away. */
+    /** The provider, or the gate with the provider behind it, freshly loaded with so many records of each class. */
+    Interfaces loadBoth(std::size_t size, const Entrance& entrance);
+
+    /**
+     * Takes the provider out of the process, and with it what it has brought there, and its records away.
+     * @throws std::runtime_error when a library stays that should not
+     */
     void unload();
 
 private:
     AgentDirectory directory{};
-    AgentLibraries agentLibraries{};
+    std::optional<AgentLibraries> agentLibraries{};
     ComputerSystems upCalls{};
     cimhost::Broker objectManager{{{}, &upCalls, {}, nullptr}};
     std::optional<ProviderLibrary> provider{};

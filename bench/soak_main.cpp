@@ -60,7 +60,7 @@ private:
 };
 
 bool soak(std::size_t cycles, std::size_t requests, bool gated) {
-    bench::Workbench workbench;
+    bench::Workbench workbench(bench::AgentStays::no);
     bench::Soak soak(workbench, gated);
     Report cycleReport("cycles");
     soak.cycle(cycles, [&](std::size_t done, const bench::Holdings& now) { cycleReport.add(done, now); });
