@@ -27,7 +27,8 @@ std::size_t entriesOf(const char* directory) {
 
 Holdings holdings() {
     const struct mallinfo2 heap = ::mallinfo2();
-    return {heap.uordblks + heap.hblkhd, residentBytes(), entriesOf("/proc/self/fd"), entriesOf("/proc/self/task")};
+    return {heap.uordblks + heap.hblkhd, heap.hblkhd, residentBytes(), entriesOf("/proc/self/fd"),
+            entriesOf("/proc/self/task")};
 }
 
 }  // namespace bench

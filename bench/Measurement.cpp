@@ -118,11 +118,14 @@ void measureLoading(benchmark::State& state, Workbench& bench, std::size_t size)
     state.counters["text_per_record"] = perRecord(std::filesystem::file_size(file));
     for (auto _ : state) {
         ::malloc_trim(0);  // what earlier iterations freed must not be there to be taken again
-        const std::size_t memoryBefore = holdings().resident;
+        const Holdings before = holdings();
         double begin = processorSeconds();
         std::optional<SharedLibrary> library(Entrance::provided().file);
         double seconds = processorSeconds() - begin;
-        state.counters["bytes_per_record"] = perRecord(holdings().resident - memoryBefore);
+        const Holdings after = holdings();
+        state.counters["bytes_per_record"] = perRecord(after.resident - before.resident);
+        state.counters["table_per_record"] = perRecord(after.mapped - before.mapped);
+        state.counters["pieces_per_record"] = perRecord((after.heap - after.mapped) - (before.heap - before.mapped));
         begin = processorSeconds();
         library.reset();
         state.SetIterationTime(seconds + processorSeconds() - begin);

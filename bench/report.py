@@ -27,6 +27,11 @@ PLOTTED_CLASS = "VELKO_Lease"
 BEGIN = "<!-- figures of bench/report.py begin -->\n"
 END = "<!-- figures of bench/report.py end -->\n"
 SIDES = ("provider", "floor")
+# What is to take no longer a record in the largest table: what it is called, the operation, what bounds it.
+LARGEST = (("Enumerating leases", "EnumInstances", "caches, and the object manager's instances in them"),
+           ("Enumerating their names", "EnumInstanceNames", "caches, and the object manager's paths in them"),
+           ("Loading leases", "Load", "reading the file"),
+           ("Rewriting their file", "ModifyInstance", "a system call a line"))
 
 
 def run(program, min_time):
@@ -127,21 +132,61 @@ def growth_table(cases):
     for (operation, class_name), by_size in cases.items():
         largest = max(by_size)
         if largest > 100000:
-            per_record = {size: {side: by_size[size][side] / size for side in SIDES} for size in (10000, largest)}
-            growth = [f"{per_record[largest][side] / per_record[10000][side]:.2f}" for side in SIDES]
-            rows.append([operation, class_name, *(time_text(per_record[size]["provider"]) for size in per_record),
-                         *growth])
+            per_record = [time_text(by_size[size]["provider"] / size) for size in (10000, largest)]
+            rows.append([operation, class_name, *per_record, *(f"{growth(by_size, side):.2f}" for side in SIDES)])
     return table(["Request", "Class", "A record of 10,000", "of 1,000,000", "Growth", "Growth of the floor"], rows)
 
 
-def memory_table(results):
-    rows = []
+def memories(results):
+    """(class, size, counters) of each loading of a table that is large enough to have pages of its own."""
     for one in results[-1]["benchmarks"]:
         operation, class_name, side, size = one["name"].split("/")[:4]
         if (operation, side) == ("Load", "provider") and int(size) >= 10000:
-            memory, text = one["bytes_per_record"], one["text_per_record"]
-            rows.append([class_name, f"{int(size):,}", f"{text:.0f}", f"{memory:.0f}", f"{memory / text:.2f}"])
-    return table(["Class", "Records", "Bytes a record in the file", "in memory", "Ratio"], rows)
+            yield class_name, int(size), one
+
+
+def memory_table(results):
+    """The table has room for more records than there are; the pages of that room are not in use."""
+    rows = []
+    for class_name, size, one in memories(results):
+        memory, text, pieces = one["bytes_per_record"], one["text_per_record"], one["pieces_per_record"]
+        record = memory - pieces
+        cells = (text, memory, record, pieces, one["table_per_record"] - record)
+        rows.append([class_name, f"{size:,}", *(f"{cell:.0f}" for cell in cells), f"{memory / text:.2f}"])
+    return table(["Class", "Records", "Bytes a record in the file", "in memory", "of it the record", "of it its texts",
+                  "reserved besides", "Ratio of memory to file"], rows)
+
+
+def growth(by_size, side="provider"):
+    """Time a record of 1,000,000 over that of 10,000."""
+    return by_size[1000000][side] / by_size[10000][side] / 100
+
+
+def limits_table(cases, results):
+    """What the provider and the gate are to keep to, and what was measured."""
+    leases = {operation: by_size for (operation, class_name), by_size in cases.items() if class_name == "VELKO_Lease"}
+    enumeration = leases["EnumInstances"][1000]
+    scans = [leases[f"GetInstance.{place}"][10000]["provider"] / 10000 for place in ("first", "middle", "last")]
+    gated = enumeration["gated"] / enumeration["alone"] - 1
+    added = leases["GetInstance.middle"][10]["gated"] - leases["GetInstance.middle"][10]["alone"]
+    counted = json.loads(INSTRUCTIONS.read_text(encoding="utf-8"))
+    counted_part = counted["EnumInstances/VELKO_Lease/gate/1000"] / counted["EnumInstances/VELKO_Lease/provider/1000"]
+    limits = [("Enumerating 1,000 leases, in floors", enumeration["provider"] / enumeration["floor"], 3,
+               "the broker calls, which the floor makes too"),
+              ("Getting one of 10,000 leases, nanoseconds a record", max(scans), 100, "one walk over the table")]
+    limits += [(f"{what}: time a record of 1,000,000, in that of 10,000", growth(leases[operation]), 1.5,
+                f"{bound}; the floor: {growth(leases[operation], 'floor'):.2f}")
+               for what, operation, bound in LARGEST]
+    limits += [(f"Memory of {class_name} among 10,000, in bytes of its text",
+                one["bytes_per_record"] / one["text_per_record"], 2, "the layout of a record, and a piece a longer text")
+               for class_name, size, one in memories(results) if size == 10000]
+    limits += [("The gate, enumerating 1,000 leases, added per cent of the time", 100 * gated, 5,
+                "an answer is whole before it goes out"),
+               ("The same, of the instructions", 100 * counted_part, 5, "the same"),
+               ("The gate, getting one of 10 leases, added microseconds", added / 1e3, 10, "its turn and its own objects")]
+    rows = [[what, bound, f"{limit:g}", f"{number:.3g}", "kept" if number <= limit else "**missed**"]
+            for what, number, limit, bound in limits]
+    return table(["What", "What bounds it", "At most", "Measured", ""], rows)
 
 
 def draw(cases):
@@ -178,6 +223,8 @@ def figures(results):
     sizes = sorted({size for by_size in tables.values() for size in by_size})
     return "\n".join([
         machine(results[0]["context"]),
+        "### Limits\n",
+        limits_table(cases, results),
         "### Ratio provider/floor, by number of records\n",
         sizes_table(tables, sizes, ratio_text),
         "### Time of the provider, by number of records\n",
