@@ -22,7 +22,7 @@ pegasus_server() {
 # Those of ours that are registered.
 pegasus_modules() {
     modules=$(cimprovider -l 2>/dev/null </dev/null) || return 1
-    for module in $(all_modules); do
+    for module in $(modules_in "$data"/pegasus/*.mof); do
         if printf '%s\n' "$modules" | grep -qx "$module"; then
             echo "$module"
         fi
@@ -43,7 +43,7 @@ pegasus_has_class() {
 # Computers may be served by another agent's provider: their class is not ours then.
 pegasus_find_other_computers() {
     others=no
-    if ! has_computers && ! pegasus_modules | grep -qx "$(module_of "$computers")" &&
+    if ! has_computers && ! pegasus_modules | grep -qx "$(modules_in "$data/pegasus/$computers.mof")" &&
         has cimcli && pegasus_has_class "$(classes_of "$computers")"; then
         others=yes
     fi
