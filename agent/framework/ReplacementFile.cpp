@@ -43,15 +43,16 @@ public:
     TemporaryFile(const TemporaryFile&) = delete;
     TemporaryFile& operator=(const TemporaryFile&) = delete;
 
-    /** Takes over mode and owner of the file to be replaced, if it is there. */
+    /** Takes over mode and owner of the file to be replaced. If that is gone, this one stays its owner's alone. */
     void adoptAttributes(const std::string& target) {
         struct stat status {};
         if (::stat(target.c_str(), &status) != 0) {
             if (errno != ENOENT) {
                 fail(target);
             }
-            status.st_mode = 0640;
-        } else if (::fchown(file.get(), status.st_uid, status.st_gid) != 0) {
+            return;
+        }
+        if (::fchown(file.get(), status.st_uid, status.st_gid) != 0) {
             // Only the superuser may give a file away; anybody else keeps it as its own.
         }
         constexpr mode_t permissions = 07777;

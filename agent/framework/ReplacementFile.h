@@ -7,7 +7,7 @@ namespace KO {
 /**
  * Replaces a file's content as a whole: a temporary file in the same directory is written, forced to
  * the disk and renamed, so that a reader or a crash at any moment finds the old content or the new.
- * Mode and owner stay; a file that is not there gets mode 0640. A symbolic link stays one.
+ * Mode and owner stay; a file that is not there gets mode 0600. A symbolic link stays one.
  * @throws FrameworkException when that fails; the old content then stands
  */
 void replaceFile(const std::string& path, const std::string& content);

@@ -3,11 +3,13 @@
 #include "Exceptions.h"
 #include "KO/Strings.h"
 #include "agent/TemporaryDirectory.h"
+#include "support/Umask.h"
 
 #include <gmock/gmock.h>
 #include <sys/stat.h>
 
 #include <filesystem>
+#include <utility>
 
 using agent_test::TemporaryDirectory;
 using KO::File;
@@ -42,6 +44,19 @@ TEST(File, IsCreatedEmptyByOpeningForWriting) {
     ASSERT_EQ(::stat(directory.file("new").c_str(), &status), 0);
     EXPECT_EQ(status.st_size, 0);
     EXPECT_EQ(status.st_mode & 07137U, 0U) << "no rights for others, none to execute";
+}
+
+TEST(File, IsForItsOwnerAndGroupAsFarAsTheUmaskLetsThem) {
+    for (const auto& [mask, mode] :
+         {std::pair(mode_t{0}, 0640U), std::pair(mode_t{027}, 0640U), std::pair(mode_t{077}, 0600U)}) {
+        const testsupport::Umask umask(mask);
+        const TemporaryDirectory directory;
+        File file(make_wstring(directory.file("new")));
+        file.open(KO::FILE_MODE_WRITE);
+        struct stat status {};
+        ASSERT_EQ(::stat(directory.file("new").c_str(), &status), 0);
+        EXPECT_EQ(status.st_mode & 07777U, mode);
+    }
 }
 
 TEST(File, IsNotTruncatedByOpeningForWriting) {

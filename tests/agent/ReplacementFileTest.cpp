@@ -2,6 +2,7 @@
 
 #include "Exceptions.h"
 #include "agent/TemporaryDirectory.h"
+#include "support/Umask.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -40,11 +41,28 @@ TEST(ReplacementFile, TakesThePlaceOfTheOldOneWithItsMode) {
     EXPECT_EQ(entriesOf(directory), 1U) << "nothing is left behind";
 }
 
-TEST(ReplacementFile, IsNotForEverybodyWhenItIsNew) {
+TEST(ReplacementFile, KeepsTheOwner) {
+    const TemporaryDirectory directory;
+    const std::string path = directory.write("file", "old");
+    const bool mayGiveAway = ::geteuid() == 0;  // nobody else can have a file of another owner here
+    const uid_t owner = mayGiveAway ? 4711 : ::geteuid();
+    const gid_t group = mayGiveAway ? 4712 : ::getegid();
+    ASSERT_EQ(::chown(path.c_str(), owner, group), 0);
+    ASSERT_EQ(::chmod(path.c_str(), 0660), 0);
+    replaceFile(path, "new");
+    struct stat status {};
+    ASSERT_EQ(::stat(path.c_str(), &status), 0);
+    EXPECT_EQ(status.st_uid, owner);
+    EXPECT_EQ(status.st_gid, group);
+    EXPECT_EQ(modeOf(path), 0660U);
+}
+
+TEST(ReplacementFile, IsItsOwnersAloneWhenItIsNew) {
+    const testsupport::Umask none(0);
     const TemporaryDirectory directory;
     replaceFile(directory.file("file"), "new");
     EXPECT_EQ(directory.read("file"), "new");
-    EXPECT_EQ(modeOf(directory.file("file")), 0640U);
+    EXPECT_EQ(modeOf(directory.file("file")), 0600U);
 }
 
 TEST(ReplacementFile, LeavesAReaderOfTheOldContentUndisturbed) {

@@ -1,6 +1,9 @@
 #include "RecordFixture.h"
+#include "support/Umask.h"
 
 #include <algorithm>
+#include <filesystem>
+#include <utility>
 
 // The record files, byte for byte, and what a restart makes of them.
 
@@ -175,6 +178,20 @@ TEST_P(DataFileTest, ANumberThatIsNoneEndsTheReadingAndLaterRecordsRepeatWhatWas
     broken.replace(sound.find(number, second) + number.size(), 1, "many");
     writeData(kind().dataFile, broken);
     EXPECT_THAT(identifiers(), ElementsAre("A", "B", "B"));
+}
+
+TEST_P(DataFileTest, AFileIsMadeForWhomTheUmaskLetsInAndKeepsItsMode) {
+    const std::filesystem::path file = dataFile(kind().dataFile);
+    const auto modeOf = [&] { return static_cast<unsigned int>(std::filesystem::status(file).permissions()); };
+    for (const auto& [mask, mode] : {std::pair(mode_t{0}, 0666U), std::pair(mode_t{027}, 0640U)}) {
+        const testsupport::Umask umask(mask);
+        std::filesystem::remove(file);
+        createAll({"made with mask " + std::to_string(mask)});
+        EXPECT_EQ(modeOf(), mode);
+    }
+    std::filesystem::permissions(file, std::filesystem::perms::owner_read | std::filesystem::perms::owner_write);
+    createAll({"another"});
+    EXPECT_EQ(modeOf(), 0600U);
 }
 
 INSTANTIATE_RECORD_TEST(DataFileTest);

@@ -1,0 +1,19 @@
+#pragma once
+
+#include <sys/stat.h>
+
+namespace testsupport {
+
+/** The process's umask while this lives. */
+class Umask {
+public:
+    explicit Umask(mode_t mask) : before(umask(mask)) {}
+    ~Umask() { umask(before); }
+    Umask(const Umask&) = delete;
+    Umask& operator=(const Umask&) = delete;
+
+private:
+    mode_t before;
+};
+
+}  // namespace testsupport
