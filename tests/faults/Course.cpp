@@ -84,6 +84,16 @@ void makeUnreadable(const fs::path& file) {
     fs::create_directory(file);
 }
 
+void askWithoutAsset(Scene& scene, const Request& request, Course& course) {
+    scene.restart();
+    makeUnreadable(scene.dataDirectory() / assetFile);
+    course.withoutAsset = scene.ask(request).outcome;
+    scene.unload();
+    scene.configure({}, Scene::System::untold);
+    course.withoutSystem = scene.ask(request).outcome;
+    scene.configure({});
+}
+
 Lines linesOf(const std::string& content) {
     std::istringstream stream(content);
     Lines lines;
@@ -98,13 +108,9 @@ Lines linesOf(const std::string& content) {
 Course undisturbed(Scene& scene, const Request& request) {
     Course course;
     course.file = request.changes != nullptr ? request.changes : leaseFile;
-    scene.restart();
-    makeUnreadable(scene.dataDirectory() / assetFile);
-    course.withoutAsset = scene.ask(request).outcome;
-    scene.unload();
-    scene.configure({}, Scene::System::untold);
-    course.withoutSystem = scene.ask(request).outcome;
-    scene.configure({});
+    if (request.path.className == classOf(assetFile)) {
+        askWithoutAsset(scene, request, course);
+    }
     scene.restart();
     course.before = scene.instancesOf(classOf(course.file));
     course.fileBefore = scene.filesAtFirst().at(course.file);

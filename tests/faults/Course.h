@@ -8,7 +8,7 @@ namespace faults {
 
 struct Course {
     Done done;
-    testsupport::Outcome withoutAsset;   ///< what is answered while asset.dat cannot be read (docs/classes)
+    testsupport::Outcome withoutAsset;   ///< asset data: what is answered while asset.dat cannot be read (docs/classes)
     testsupport::Outcome withoutSystem;  ///< what is, when the instrumentation does not tell of the system either
     std::string file;                    ///< that the request changes; Lease.dat for one that only reads
     Lines before;                        ///< instances of the class whose file it is

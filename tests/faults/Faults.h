@@ -90,6 +90,9 @@ struct Extent {
 void eachFault(const Counts& counts, const std::vector<Failure>& failures,
                const std::function<void(const Fault&)>& body, const Extent& extent = {});
 
+/** Goes through the operations on files as the moments at which something else may happen; the faults have no error. */
+void eachMoment(const Counts& counts, const std::function<void(const Fault&)>& body);
+
 /** How many files this process has open. */
 int openDescriptors();
 

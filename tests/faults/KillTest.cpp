@@ -60,22 +60,19 @@ TEST_P(KillTest, EveryPointLeavesAssetDataWholeAndOfRecordsTheBeginningInWholeLi
     restart();
     const Counts counts = scene.ask(request()).counts;
     whole = scene.files();
-    for (const auto& [kind, count] : onFiles(counts)) {
-        for (int number = 1; number <= count && !HasFailure(); ++number) {
-            SCOPED_TRACE(std::string("killed before ") + nameOf(kind) + " number " + std::to_string(number));
-            killBefore(kind, number);
-            FileContents left = scene.files();
-            for (const auto& [name, content] : before) {
-                if (name != file()) {
-                    EXPECT_EQ(left.at(name), content);
-                }
+    eachMoment(counts, [&](const Fault& moment) {
+        killBefore(moment.kind, moment.number);
+        const FileContents left = scene.files();
+        for (const auto& [name, content] : before) {
+            if (name != file()) {
+                EXPECT_EQ(left.at(name), content);
             }
-            EXPECT_LE(left.size(), before.size() + (file() == assetFile ? 1 : 0)) << "one temporary file at most";
-            expectWholeOrBeginning(left);
-            EXPECT_EQ(scene.ask(repairOf(file())).outcome.rc, CMPI_RC_OK) << "the next process serves";
-            EXPECT_EQ(scene.ask(request()).outcome.rc, CMPI_RC_OK);
         }
-    }
+        EXPECT_LE(left.size(), before.size() + (file() == assetFile ? 1 : 0)) << "one temporary file at most";
+        expectWholeOrBeginning(left);
+        EXPECT_EQ(scene.ask(repairOf(file())).outcome.rc, CMPI_RC_OK) << "the next process serves";
+        EXPECT_EQ(scene.ask(request()).outcome.rc, CMPI_RC_OK);
+    });
 }
 
 INSTANTIATE_TEST_SUITE_P(Requests, KillTest, testing::ValuesIn(changingRequests()),

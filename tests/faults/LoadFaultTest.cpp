@@ -51,6 +51,11 @@ protected:
         return counts;
     }
 
+    void makeFilesOfSeveralReads() {
+        files[leaseFile] = leaseRecords(80);
+        files[warrantyFile] = warrantyRecords(180);
+    }
+
     /** All records or none of each class, whatever fails; all if what fails is only to be done again. */
     void failEach(const std::vector<Failure>& failures, const Extent& extent) {
         const Counts counts = load(nullptr);
@@ -67,9 +72,7 @@ protected:
             EXPECT_THAT(leases, AnyOf(allLeases, IsEmpty()));
             EXPECT_THAT(warranties, AnyOf(allWarranties, IsEmpty()));
             EXPECT_EQ(scene.files(), files);
-            if (!fault.lasting && fault.error == EIO && fault.kind == operationRead) {
-                ++leftByReads[{!leases.empty(), !warranties.empty()}];
-            }
+            ++left[{!leases.empty(), !warranties.empty()}];
         };
         eachFault(counts, failures, failOne, extent);
     }
@@ -78,7 +81,7 @@ protected:
     FileContents files;
     Lines leases;
     Lines warranties;
-    std::map<std::pair<bool, bool>, int> leftByReads;  ///< whether there were leases and warranties after a failed read
+    std::map<std::pair<bool, bool>, int> left;  ///< how often there were leases and warranties after a fault
 };
 
 TEST_F(LoadFaultTest, WithoutMemoryTheLibraryIsLoadedAndHasAllRecordsOrNone) {
@@ -87,11 +90,15 @@ TEST_F(LoadFaultTest, WithoutMemoryTheLibraryIsLoadedAndHasAllRecordsOrNone) {
 
 /** Fields that are not read count as missing: a failure must not be taken for the end of the file. */
 TEST_F(LoadFaultTest, WithoutFilesTheLibraryIsLoadedAndHasAllRecordsOrNoneInsteadOfCopies) {
-    files[leaseFile] = leaseRecords(80);
-    files[warrantyFile] = warrantyRecords(180);
-    failEach(fileFailures(), {true, 100, true});
-    EXPECT_THAT(leftByReads, ElementsAre(Pair(Pair(false, false), 2), Pair(Pair(false, true), Gt(1)),
-                                         Pair(Pair(true, false), Gt(1)), Pair(Pair(true, true), 2)))
+    makeFilesOfSeveralReads();
+    failEach(fileFailures(), {});
+}
+
+TEST_F(LoadFaultTest, EachReadThatFailsCostsItsOwnFileOnly) {
+    makeFilesOfSeveralReads();
+    failEach({{operationRead, EIO}}, {false, 100, true});
+    EXPECT_THAT(left, ElementsAre(Pair(Pair(false, false), 2), Pair(Pair(false, true), Gt(1)),
+                                  Pair(Pair(true, false), Gt(1)), Pair(Pair(true, true), 2)))
         << "the agent's configuration, leases, warranties, and the log's configuration";
 }
 

@@ -97,11 +97,7 @@ protected:
 
 TEST_P(VanishingTest, AnswersAsItShouldAndTheNextChangeStoresEverything) {
     vanishAt(nullptr);
-    std::vector<Failure> moments;
-    for (const auto& each : onFiles(course.done.counts)) {
-        moments.push_back({each.first, 0});
-    }
-    eachFault(course.done.counts, moments, [&](const Fault& fault) { vanishAt(&fault); }, {false});
+    eachMoment(course.done.counts, [&](const Fault& moment) { vanishAt(&moment); });
 }
 
 std::string nameOfTest(const testing::TestParamInfo<VanishingTest::ParamType>& tested) {
