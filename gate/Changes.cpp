@@ -149,7 +149,8 @@ Values undoing(const Class& owner, const DataFile& file, const Values& changes, 
 
 bool areSame(const Values& properties, const CMPIInstance* one, const CMPIInstance* other) {
     return std::all_of(properties.begin(), properties.end(), [&](const auto& value) {
-        return propertyOf(one, *value.first) == propertyOf(other, *value.first);
+        return sameName(value.first->name, movingProperty) ||
+               propertyOf(one, *value.first) == propertyOf(other, *value.first);
     });
 }
 

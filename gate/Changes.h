@@ -32,7 +32,7 @@ Values changed(const Class& owner, const CMPIInstance* current, const Values& ch
  */
 Values undoing(const Class& owner, const DataFile& file, const Values& changes, const CMPIInstance* current);
 
-/** Whether two instances have the same of each of these properties. */
+/** Whether two instances have the same of each of these properties, but for the clock. */
 bool areSame(const Values& properties, const CMPIInstance* one, const CMPIInstance* other);
 
 /** Whether a file of records cannot be the same after the changes as before. */
