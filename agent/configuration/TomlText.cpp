@@ -1,6 +1,7 @@
 #include "configuration/TomlText.h"
 
 #include <algorithm>
+#include <string>
 
 namespace Agent {
 
@@ -15,9 +16,45 @@ bool isAscii(char byte) {
     return static_cast<unsigned char>(byte) < 0x80;
 }
 
-bool mayPrecedeString(char byte) {
-    return std::string_view("\n=,[{.").find(byte) != std::string_view::npos;
+bool isOneOf(char byte, std::string_view bytes) {
+    return bytes.find(byte) != std::string_view::npos;
 }
+
+/**
+ * Whether a byte stands in a value that is neither string nor array nor table, such as a number. In the rest of such a
+ * value the parser looks for the end without knowing of strings, in which it would come upon any character.
+ */
+class BareValue {
+public:
+    /** Takes what is outside of strings and comments, byte by byte. @param isFirst whether nothing is before it */
+    void follow(char byte, bool isFirst) {
+        isHeader = (isHeader && byte != '\n') || (byte == '[' && isFirst && nesting.empty());
+        if (isOneOf(byte, "[{")) {
+            nesting.push_back(byte);
+        } else if (isOneOf(byte, "]}") && !nesting.empty()) {
+            nesting.pop_back();
+        }
+        const bool isElement = !isHeader && !nesting.empty() && nesting.back() == '[';
+        if (byte == '=' || isOneOf(byte, "[{,\n")) {
+            isAwaited = byte == '=' || isElement;
+        } else if (!isOneOf(byte, " \t\r")) {
+            isInside = (isInside || isAwaited) && !isOneOf(byte, "]}");
+            isAwaited = false;
+        }
+        isInside = isInside && !isOneOf(byte, " \t\r\n,");
+    }
+
+    void followString() { isAwaited = false; }
+
+    /** Whether a byte cannot go on with the value in which it stands. */
+    bool isBrokenBy(char byte) const { return isInside && isOneOf(byte, "=[{\"'"); }
+
+private:
+    std::string nesting{};  ///< the brackets that are open
+    bool isHeader = false;  ///< in the line of a table's name
+    bool isAwaited = false;
+    bool isInside = false;
+};
 
 /** Goes over a text once, knowing of TOML no more than what is string, what is comment and what neither. */
 class Scan {
@@ -38,17 +75,21 @@ public:
 private:
     void step() {
         const char byte = rest.front();
-        if (byte == '"' || byte == '\'') {
+        if (value.isBrokenBy(byte)) {
+            reason = "a value goes on where it has to end";
+        } else if (byte == '"' || byte == '\'') {
             skipString(byte);
-            reason = mayPrecedeString(last) ? reason : "a string stands where none may be";
+            reason = isOneOf(last, "\n=,[{.") ? reason : "a string stands where none may be";
             last = byte;
+            value.followString();
         } else if (byte == '#') {
             skip(std::min(rest.find('\n'), rest.size()));
         } else if (!isAscii(byte)) {
             reason = "a character outside of ASCII stands outside of strings and comments";
         } else {
             skip(1);
-            last = byte == ' ' || byte == '\t' ? last : byte;
+            value.follow(byte, last == '\n');
+            last = isOneOf(byte, " \t") ? last : byte;
             dots += byte == '.' ? 1 : 0;
             reason = dots > mostDotsOfALine ? "a key has too many parts" : nullptr;
         }
@@ -96,7 +137,8 @@ private:
     std::string_view rest;
     std::size_t line = 1;
     std::size_t dots = 0;  ///< of this line
-    char last = '\n';      ///< the byte before that is neither blank nor in a string or comment
+    BareValue value{};
+    char last = '\n';  ///< the byte before that is neither blank nor in a string or comment
     const char* reason = nullptr;
 };
 

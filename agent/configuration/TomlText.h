@@ -14,7 +14,8 @@ struct Objection {
 
 /**
  * The first thing in a text for which it must not be given to the TOML parser, which would come to grief on it:
- * a character outside of ASCII where none may be or where a line's continuation begins, or a key of very many parts.
+ * a character outside of ASCII where none may be or where a line's continuation begins, a string or bracket in the
+ * middle of a number, or a key of very many parts.
  */
 std::optional<Objection> objectionTo(std::string_view text);
 

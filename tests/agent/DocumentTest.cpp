@@ -83,6 +83,24 @@ TEST(Document, RefusesAnEscapeOutsideOfAscii) {
     }
 }
 
+TEST(Document, RefusesAValueThatGoesOnWhereItHasToEnd) {
+    for (const char* text : {"a =0=[l0=\"\"\"\xC2\xA7\"\"[", "a = 1\"\xC2\xA7\"", "a = [0='\xC2\xA7']",
+                             "a = {b = x[\"\xC2\xA7\"]}", "a = [\n1, 2'\xC2\xA7']"}) {
+        EXPECT_THAT(Document::parse(text, "agent.toml").problem(), HasSubstr("a value goes on where it has to end"))
+            << text;
+    }
+}
+
+TEST(Document, MayHaveAllKindsOfValuesAndKeys) {
+    const char* text =
+        "name = 'x'\n[table.\"quoted\"]\n[[\"tables\".x]]\n'key' = 1\n[more]\n"
+        "array = [ 1,2 ,[ 'a',\"b\" ], {c = 'd',e='f'},\n 3 # '=[\n, 'g' ]\n"
+        "inline = {a = 1, b.\"c\" = true,d='e'}\ndate = 1979-05-27 07:32:00 # \"\nfloat=-1e5\r\nlast='\xC2\xA7'";
+    const Document document = Document::parse(text, "agent.toml");
+    EXPECT_EQ(document.problem(), "");
+    EXPECT_EQ(nameIn(document), "x");
+}
+
 TEST(Document, MayHaveAnyCharacterBehindABackslashThatIsNoEscape) {
     const Document document = Document::parse("name = '\\\xC3\xA4' # \\\xC3\xA4", "");
     EXPECT_EQ(document.problem(), "");
