@@ -97,7 +97,7 @@ void follow(const Request& request, const AssociationFilter& filter, Take take) 
         return;
     }
     const Provider provider(request);
-    const std::vector<Computer> computers = knownComputers(request);
+    const std::vector<Computer> computers = knownComputers(request, provider);
     for (const Way& way : ways) {
         for (const Link& link : linksAlong(way, provider, computers, request.path)) {
             take(way, link, provider);
@@ -133,7 +133,7 @@ const CMPIInstance* associationInstance(const Request& request, const Class& ass
 
 std::vector<Link> allLinks(const Request& request, const Class& association) {
     const Provider provider(request);
-    return linksOf(provider, knownComputers(request), association);
+    return linksOf(provider, knownComputers(request, provider), association);
 }
 
 /** Makes an answer of an association's class and link. */

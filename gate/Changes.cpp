@@ -165,22 +165,22 @@ bool showIn(const DataFile& file, const CMPIInstance* current, const Values& cha
 namespace {
 
 /** Whether the value that a property had was one that the changes take away, which may stand behind two properties. */
-bool wasTakenAway(const std::string& text, const CMPIInstance* before, const Values& changes) {
+bool wasTakenAway(const std::string& text, const DataFile& file, const CMPIInstance* before, const Values& changes) {
     return std::any_of(changes.begin(), changes.end(), [&](const auto& change) {
-        const bool isEmptied =
-            change.second.empty() || (change.first->type == CMPI_dateTime && change.second == noDate);
+        const bool isDate = change.first->type == CMPI_dateTime;
+        const bool isEmptied = change.second.empty() || (isDate && !isShown(file, change.second));
         return isEmptied && propertyOf(before, *change.first) == text;
     });
 }
 
 /** Fails if a value that was not to be changed is not there any more. */
-void requireNothingLost(const Class& owner, const CMPIInstance* before, const CMPIInstance* after,
+void requireNothingLost(const Class& owner, const DataFile& file, const CMPIInstance* before, const CMPIInstance* after,
                         const Values& changes) {
     for (const Property& property : owner) {
         const std::string text = propertyOf(before, property).value_or(std::string());
         const std::string now = propertyOf(after, property).value_or(std::string());
         const bool isLost = stored(property, now).empty() && !stored(property, text).empty();
-        if (isLost && !isAmong(property, changes) && !wasTakenAway(text, before, changes)) {
+        if (isLost && !isAmong(property, changes) && !wasTakenAway(text, file, before, changes)) {
             fail(CMPI_RC_ERR_FAILED, std::string(property.name) + " was lost: the data file could not be read.");
         }
     }
@@ -190,7 +190,7 @@ void requireNothingLost(const Class& owner, const CMPIInstance* before, const CM
 
 void requireChanged(const Class& owner, const DataFile& file, const CMPIInstance* before, const CMPIInstance* after,
                     const Values& changes) {
-    requireNothingLost(owner, before, after, changes);
+    requireNothingLost(owner, file, before, after, changes);
     for (const auto& [property, text] : changes) {
         const auto now = propertyOf(after, *property);
         const bool isDate = property->type == CMPI_dateTime;

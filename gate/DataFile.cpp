@@ -123,12 +123,21 @@ void DataFile::requireWritable(std::size_t growth) const {
     }
 }
 
-std::string DataFile::text() const {
+FileState DataFile::state() const {
     if (!keepsRecords()) {
         return {};
     }
-    std::ifstream stream(pathOf(*this), std::ios::binary);
-    return {std::istreambuf_iterator<char>(stream), std::istreambuf_iterator<char>()};
+    const std::string path = pathOf(*this);
+    struct stat status {};
+    if (stat(path.c_str(), &status) != 0) {
+        return {};
+    }
+    FileState state{std::string(static_cast<std::size_t>(status.st_size), '\0'),
+                    status.st_mtim.tv_sec * 1000000000LL + status.st_mtim.tv_nsec};
+    std::ifstream stream(path, std::ios::binary);
+    stream.read(state.text.data(), status.st_size);  // throws nothing, whatever the file does
+    state.text.resize(static_cast<std::size_t>(stream.gcount()));
+    return state;
 }
 
 bool DataFile::isWhole(std::string_view text) const {
@@ -152,7 +161,7 @@ std::size_t DataFile::recordsIn(std::string_view text, const std::string& identi
 
 std::optional<std::size_t> DataFile::recordsIfWhole(const std::string& identifier) const {
     try {
-        return recordsIn(text(), identifier);
+        return recordsIn(state().text, identifier);
     } catch (const Failure&) {
         return std::nullopt;
     }

@@ -3,11 +3,20 @@
 #include "Schema.h"
 
 #include <cstddef>
+#include <cstdint>
 #include <optional>
 #include <string>
 #include <string_view>
 
 namespace gate {
+
+/** What a file of records held, and when it had been written last. */
+struct FileState {
+    std::string text;           ///< nothing where it cannot be read, and for a property file
+    std::int64_t modified = 0;  ///< some count of time
+
+    bool operator==(const FileState& other) const { return modified == other.modified && text == other.text; }
+};
 
 /**
  * The file in which a class's instances are kept. The provider writes it and tells nobody when it cannot: the gate
@@ -28,8 +37,7 @@ struct DataFile {
      */
     void requireWritable(std::size_t growth) const;
 
-    /** All that a file of records holds; nothing where it cannot be read, and for a property file. */
-    std::string text() const;
+    FileState state() const;
 
     /**
      * How many records with that identifier are in the text of a file, 0 for a property file. CMPI_RC_ERR_FAILED when

@@ -60,6 +60,8 @@ CMPIStatus guarded(Broker broker, Work work) {
         return {CMPI_RC_OK, nullptr};
     } catch (const abi::__forced_unwind&) {
         throw;  // the thread is being ended: no exception, and not to be stopped
+    } catch (const Ended&) {
+        return statusOf(CMPI_RC_ERR_FAILED, closed);
     } catch (const Failure& failure) {
         return statusOf(broker(), failure.rc, failure.text.c_str());
     } catch (const std::exception& exception) {
@@ -73,7 +75,11 @@ CMPIStatus guarded(Broker broker, Work work) {
 class Visit {
 public:
     Visit() noexcept : isLetIn(theGate.arrive()) {}
-    ~Visit() { theGate.depart(); }
+    ~Visit() {
+        if (isLetIn) {
+            theGate.depart();
+        }
+    }
     Visit(const Visit&) = delete;
     Visit& operator=(const Visit&) = delete;
 

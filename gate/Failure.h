@@ -13,6 +13,9 @@ struct Failure {
     std::string text;
 };
 
+/** Ends a request whose object manager has ended: nothing of it may be used any more. */
+struct Ended {};
+
 [[noreturn]] inline void fail(CMPIrc rc, std::string text) {
     throw Failure{rc, std::move(text)};
 }

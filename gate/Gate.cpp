@@ -21,16 +21,21 @@ Gate theGate;
 
 struct Gate::Waiter {
     std::condition_variable call{};
+    WhenShut whenShut = WhenShut::goAway;
     bool isAdmitted = false;
+    bool isSentAway = false;
     Waiter* next = nullptr;
 };
 
 bool Gate::arrive() noexcept {
     const std::lock_guard<std::mutex> lock(mutex);
+    if (state != State::open) {
+        return false;
+    }
     process = getpid();
     ++arrived;
     ++arrivedHere;
-    return state == State::open;
+    return true;
 }
 
 void Gate::depart() noexcept {
@@ -42,29 +47,55 @@ void Gate::depart() noexcept {
 
 bool Gate::enter() noexcept {
     std::unique_lock<std::mutex> lock(mutex);
-    if (state != State::open) {
-        return false;
-    }
-    waitForTurn(lock);
-    return true;
+    return state == State::open && waitForTurn(lock, WhenShut::goAway);
 }
 
 void Gate::comeBack() noexcept {
     std::unique_lock<std::mutex> lock(mutex);
-    waitForTurn(lock);
+    waitForTurn(lock, WhenShut::wait);
 }
 
-void Gate::waitForTurn(std::unique_lock<std::mutex>& lock) {
-    if (!isTaken && state != State::shut) {
-        isTaken = true;
-    } else {
+bool Gate::resume() noexcept {
+    std::unique_lock<std::mutex> lock(mutex);
+    return waitForTurn(lock, WhenShut::goAway);
+}
+
+bool Gate::waitForTurn(std::unique_lock<std::mutex>& lock, WhenShut whenShut) {
+    const bool canWait = state != State::shut || whenShut == WhenShut::wait;
+    if (canWait && (isTaken || state == State::shut)) {
         Waiter self;
-        (queue.first == nullptr ? queue.first : queue.last->next) = &self;
-        queue.last = &self;
-        ++queue.length;
-        self.call.wait(lock, [&] { return self.isAdmitted; });
+        self.whenShut = whenShut;
+        join(self);
+        self.call.wait(lock, [&] { return self.isAdmitted || self.isSentAway; });
+        isInsideHere = self.isAdmitted;
+    } else {
+        isInsideHere = canWait;
+        isTaken = isTaken || canWait;
     }
-    isInsideHere = true;
+    return isInsideHere;
+}
+
+void Gate::join(Waiter& waiter) {
+    (queue.first == nullptr ? queue.first : queue.last->next) = &waiter;
+    queue.last = &waiter;
+    ++queue.length;
+}
+
+/** Those in the queue who do not wait for a gate that is shut. */
+void Gate::sendAway() {
+    Waiter* next = queue.first;
+    queue = {};
+    while (next != nullptr) {
+        Waiter& waiter = *next;
+        next = waiter.next;
+        waiter.next = nullptr;
+        if (waiter.whenShut == WhenShut::wait) {
+            join(waiter);
+        } else {
+            waiter.isSentAway = true;
+            waiter.call.notify_one();  // under the lock: the waiter lives until it has it
+        }
+    }
 }
 
 void Gate::leave() noexcept {
@@ -95,13 +126,6 @@ bool Gate::isEmptyButForCaller() const {
 void Gate::tellClosers() {
     for (Waiter* closer = closers; closer != nullptr; closer = closer->next) {
         closer->call.notify_one();
-    }
-}
-
-void Gate::pass() noexcept {
-    if (state == State::shut && !isInsideHere) {
-        comeBack();
-        leave();
     }
 }
 
@@ -147,6 +171,7 @@ void Gate::shut(std::unique_lock<std::mutex>& lock, const std::function<void()>&
     isTaken = wasTaken;
     state = State::shut;
     ++timesShut;
+    sendAway();
     tellClosers();
 }
 
@@ -169,6 +194,15 @@ bool Gate::hasOthers() const noexcept {
 std::size_t Gate::waiting() const noexcept {
     const std::lock_guard<std::mutex> lock(mutex);
     return queue.length;
+}
+
+std::size_t Gate::closing() const noexcept {
+    const std::lock_guard<std::mutex> lock(mutex);
+    std::size_t count = 0;
+    for (const Waiter* closer = closers; closer != nullptr; closer = closer->next) {
+        ++count;
+    }
+    return count;
 }
 
 Uncancelled::Uncancelled() noexcept {

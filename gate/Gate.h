@@ -33,7 +33,7 @@ public:
     Gate(const Gate&) = delete;
     Gate& operator=(const Gate&) = delete;
 
-    /** Whether the request is let in. In either case, depart() has to follow. */
+    /** Whether the request is let in. Then depart() has to follow. */
     bool arrive() noexcept;
     void depart() noexcept;
 
@@ -41,13 +41,13 @@ public:
     bool enter() noexcept;
     /** Gives the turn to who has waited longest. */
     void leave() noexcept;
-    /** Waits for the turn after a leave() that only interrupted it. */
+    /** Waits for the turn after a leave() that only interrupted it; also while the gate is shut. */
     void comeBack() noexcept;
+    /** The same, but false, and no turn, when the gate is shut. */
+    bool resume() noexcept;
 
-    /**
-     * Waits while the gate is shut: for who is outside but is about to call the object manager, which may have gone.
-     */
-    void pass() noexcept;
+    /** Whether the gate is shut: the object manager has gone. */
+    bool isShut() const noexcept { return state == State::shut; }
 
     /**
      * Shuts the gate when nobody is inside or waits to be, but for the calling thread. Before that it gives the
@@ -62,14 +62,17 @@ public:
     /** Opens a gate that is shut. @return whether it is open now: it is not while it closes, or when shut for good */
     bool open() noexcept;
 
-    /** Whether requests that came on other threads have not departed. */
+    /** Whether requests that were let in on other threads have not departed. */
     bool hasOthers() const noexcept;
 
     /** How many wait for their turn. */
     std::size_t waiting() const noexcept;
+    /** How many wait to shut the gate. */
+    std::size_t closing() const noexcept;
 
 private:
     enum class State { open, closing, shut };
+    enum class WhenShut { goAway, wait };
     struct Waiter;
 
     /** Who waits, in order; each waiter stands on the stack of its thread. */
@@ -79,7 +82,9 @@ private:
         std::size_t length = 0;
     };
 
-    void waitForTurn(std::unique_lock<std::mutex>& lock);
+    bool waitForTurn(std::unique_lock<std::mutex>& lock, WhenShut whenShut);
+    void join(Waiter& waiter);
+    void sendAway();
     void admitNext();
     bool isEmptyButForCaller() const;
     void shut(std::unique_lock<std::mutex>& lock, const std::function<void()>& atEnd);
@@ -99,6 +104,13 @@ private:
 /** The gate of this library: there is one provider behind it. */
 extern Gate theGate;
 
+/** Ended when the gate is shut: for who is about to call the object manager without a turn. */
+inline void requireManager() {
+    if (theGate.isShut()) {
+        throw Ended{};
+    }
+}
+
 /** Keeps the thread from being cancelled while it lives: that would end the process, or cut a file in two. */
 class Uncancelled {
 public:
@@ -117,20 +129,46 @@ constexpr const char* closedText = "The provider is shutting down. Ask again whe
 /** A turn at the gate while it lives; CMPI_RC_ERR_FAILED when the gate closes. */
 class Turn {
 public:
-    Turn() {
-        if (!theGate.enter()) {
+    Turn() : isHeld(theGate.enter()) {
+        if (!isHeld) {
             fail(CMPI_RC_ERR_FAILED, closedText);
         }
     }
-    ~Turn() { theGate.leave(); }
+    ~Turn() {
+        if (isHeld) {
+            theGate.leave();
+        }
+    }
     Turn(const Turn&) = delete;
     Turn& operator=(const Turn&) = delete;
 
+    /** Does some work while others may have the turn. Ended when the gate was shut meanwhile; the turn is lost then. */
+    template <class Work>
+    void interruptFor(Work work) {
+        theGate.leave();
+        isHeld = false;
+        try {
+            work();
+        } catch (...) {
+            resume();
+            throw;
+        }
+        resume();
+    }
+
 private:
+    void resume() {
+        isHeld = theGate.resume();
+        if (!isHeld) {
+            throw Ended{};
+        }
+    }
+
     Uncancelled uncancelled;
+    bool isHeld;
 };
 
-/** Interrupts the turn that the caller has, while it lives. */
+/** Interrupts the turn that the caller has, while it lives: for what cannot end there, in the middle of a provider. */
 class Pause {
 public:
     Pause() noexcept { theGate.leave(); }

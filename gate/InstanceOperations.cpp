@@ -60,7 +60,7 @@ struct Target {
 
     /** @param before how many records with the identifier there were before this one was deleted */
     void requireDeleted(std::size_t before) const {
-        const std::size_t after = file.recordsIn(file.text(), identifier());
+        const std::size_t after = file.recordsIn(file.state().text, identifier());
         if (after != 0 && after >= before) {
             fail(CMPI_RC_ERR_FAILED, std::string(file.fileName) + " still holds " + identifier() + ".");
         }
@@ -72,9 +72,21 @@ struct Target {
         return now && now == before.value_or(*now);
     }
 
-    /** Whether the file is whole and what it was, if that was whole. */
-    bool holdsAgain(const std::string& before) const {
-        return file.recordsIfWhole(identifier()) && (file.text() == before || !file.isWhole(before));
+    /**
+     * Whether the file is whole and does not keep a change that failed.
+     * @param before what it held before the change
+     * @param failed what it held after it
+     */
+    bool isWithout(const FileState& before, const FileState& failed) const {
+        const FileState now = file.state();
+        return file.isWhole(now.text) && (now.text == before.text || !(now == failed));
+    }
+
+    /** What a failure says where the file could not be brought back. */
+    std::string wordOfFile() const {
+        return std::string(" ") + file.fileName +
+               (file.keepsRecords() ? " stays damaged until the next change succeeds."
+                                    : " may not be what it was before.");
     }
 };
 
@@ -107,13 +119,18 @@ template <class Change, class Undo>
 void orUndone(const Target& target, Change change, Undo undo) {
     try {
         change();
+    } catch (const Ended&) {
+        throw;  // without the turn nothing can be undone, and there is nobody to tell
     } catch (Failure& failure) {
         if (!isUndoneBy(undo)) {
-            failure.text += std::string(" ") + target.file.fileName;
-            failure.text += target.file.keepsRecords() ? " stays damaged until the next change succeeds."
-                                                       : " may not be what it was before.";
+            failure.text += target.wordOfFile();
         }
         throw;
+    } catch (const std::exception& exception) {
+        if (isUndoneBy(undo)) {
+            throw;
+        }
+        fail(CMPI_RC_ERR_FAILED, std::string("The request broke off: ") + exception.what() + "." + target.wordOfFile());
     } catch (...) {
         isUndoneBy(undo);
         throw;
@@ -125,11 +142,11 @@ void orUndone(const Target& target, Change change, Undo undo) {
  * @param before what the file held
  */
 void apply(const Provider& provider, const Target& target, const CMPIInstance* current, const Values& changes,
-           const std::string& before) {
+           const FileState& before) {
     provider.modify(target.path, OwnInstance(changed(target.owner, current, changes)));
     requireChanged(target.owner, target.file, current, existing(provider, target.path, target.owner), changes);
-    const std::string after = target.file.text();
-    target.requireStored(after);
+    const FileState after = target.file.state();
+    target.requireStored(after.text);
     if (target.file.keepsRecords() && after == before && showIn(target.file, current, changes)) {
         fail(CMPI_RC_ERR_FAILED, std::string(target.file.fileName) + " was not written.");
     }
@@ -172,8 +189,8 @@ void requireReadOnly(const Provider& provider, const Target& target, const Value
 void fillNew(const Provider& provider, const Target& target, const Values& given) {
     const CMPIInstance* current = existing(provider, target.path, target.owner);
     const Values changes = changesTo(current, given, false);
-    const std::string stored = target.file.text();
-    target.requireStored(stored);
+    const FileState stored = target.file.state();
+    target.requireStored(stored.text);
     if (!changes.empty()) {
         apply(provider, target, current, changes, stored);
     }
@@ -192,21 +209,36 @@ void create(const Request& request, const Provider& provider, const Target& targ
     CMPIObjectPath* answer = makePath(request.broker, nameSpaceOf(request.path), target.owner.name);
     addKey(answer, identifierKey, target.identifier());
     const std::optional<std::size_t> before = target.file.recordsIfWhole(target.identifier());
-    const std::size_t removals = Provider::removals();
+    const Provider::Watch watch(target.path);
     const auto change = [&] {
         provider.create(target.path);
         fillNew(provider, target, given);
-        const Pause pause;
-        request.give(answer);
-        request.finish();
+        provider.letOthersIn([&] {
+            request.give(answer);
+            request.finish();
+        });
     };
     orUndone(target, change, [&] {
-        if (Provider::removals() != removals) {
-            return true;  // while the path went out, somebody may have deleted this record and made another
+        if (watch.sawRemoval()) {
+            return true;  // while the path went out: what is there now is somebody else's
         }
         provider.remove(target.path);
         return target.hasAgain(before);
     });
+}
+
+/** Makes a deleted record with its values again; whether the file has both. */
+bool isMadeAnew(const Provider& provider, const Target& target, const Values& values) {
+    try {
+        provider.create(target.path);
+    } catch (const Failure&) {
+        // It may have been made all the same: the answer to it is the last thing that can fail.
+    }
+    const CMPIInstance* made = existing(provider, target.path, target.owner);
+    const FileState empty = target.file.state();
+    const bool shows = showIn(target.file, made, values);
+    provider.modify(target.path, OwnInstance(values));
+    return !shows || !(target.file.state() == empty);
 }
 
 }  // namespace
@@ -268,13 +300,14 @@ void modifyInstance(const Request& request, const CMPIInstance* instance, const 
     requireKept(file, changes);
     if (!changes.empty()) {
         file.requireWritable(sizeOf(changes));
-        const std::string before = file.text();
+        const FileState before = file.state();
         const Values restored = undoing(requested, file, changes, current);
         const OwnInstance undone(changed(requested, current, restored));
         const auto change = [&] { apply(provider, target, current, changes, before); };
         orUndone(target, change, [&] {
+            const FileState failed = file.state();
             provider.modify(target.path, undone);
-            return file.keepsRecords() ? target.holdsAgain(before)
+            return file.keepsRecords() ? target.isWithout(before, failed)
                                        : areSame(restored, current, existing(provider, target.path, requested));
         });
     }
@@ -286,7 +319,7 @@ void deleteInstance(const Request& request) {
     const Target target{requested, file, namingPath(request.path, requested)};
     const Provider provider(request);
     const CMPIInstance* current = existing(provider, target.path, requested);
-    const OwnInstance restored(givenValues(requested, current, PropertyList(nullptr)));
+    const Values restored = givenValues(requested, current, PropertyList(nullptr));
     file.requireWritable(0);
     const std::optional<std::size_t> before = file.recordsIfWhole(target.identifier());
     const auto change = [&] {
@@ -294,11 +327,8 @@ void deleteInstance(const Request& request) {
         target.requireDeleted(before.value_or(0));
     };
     orUndone(target, change, [&] {
-        if (provider.get(target.path) == nullptr) {
-            provider.create(target.path);
-            provider.modify(target.path, restored);
-        }
-        return target.hasAgain(before);
+        const bool isThere = provider.get(target.path) != nullptr || isMadeAnew(provider, target, restored);
+        return isThere && target.hasAgain(before);
     });
 }
 

@@ -10,7 +10,7 @@ namespace gate {
 
 namespace {
 
-CMPIEnumeration* enumerateComputers(const Request& request) {
+CMPIEnumeration* enumerateComputers(const Request& request, const Provider& provider) {
     const CMPIBroker& broker = *request.broker;
     if (broker.bft == nullptr || broker.bft->enumerateInstances == nullptr) {
         fail(CMPI_RC_ERR_FAILED, "The object manager cannot enumerate computers.");
@@ -18,10 +18,9 @@ CMPIEnumeration* enumerateComputers(const Request& request) {
     const CMPIObjectPath* classPath = makePath(request.broker, nameSpaceOf(request.path), computerClass);
     CMPIStatus status{CMPI_RC_OK, nullptr};
     CMPIEnumeration* computers = nullptr;
-    {
-        const Pause pause;
+    provider.letOthersIn([&] {
         computers = broker.bft->enumerateInstances(request.broker, request.context, classPath, nullptr, &status);
-    }
+    });
     require(status.rc == CMPI_RC_OK && computers != nullptr, "enumerate computers", status);
     return computers;
 }
@@ -52,9 +51,9 @@ const CMPIObjectPath* computerPathOf(const Request& request, const CMPIInstance*
 
 }  // namespace
 
-std::vector<Computer> knownComputers(const Request& request) {
+std::vector<Computer> knownComputers(const Request& request, const Provider& provider) {
     std::vector<Computer> computers;
-    CMPIEnumeration* enumeration = enumerateComputers(request);
+    CMPIEnumeration* enumeration = enumerateComputers(request, provider);
     while (hasNext(enumeration)) {
         const auto next = ask<&CMPIEnumerationFT::getNext>(enumeration);
         const bool isInstance = next.isOk() && next.value.type == CMPI_instance &&

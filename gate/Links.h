@@ -21,10 +21,10 @@ struct Computer {
 };
 
 /**
- * Asks the object manager for the computers in the request's namespace, each once. The caller has the turn, which
- * others may take while the object manager asks another provider: maybe one that asks this one.
+ * Asks the object manager for the computers in the request's namespace, each once. Others may have the turn while
+ * the object manager asks another provider: that one may ask this one.
  */
-std::vector<Computer> knownComputers(const Request& request);
+std::vector<Computer> knownComputers(const Request& request, const Provider& provider);
 
 /** What belongs to the computers by an association, in their order. */
 std::vector<Link> linksOf(const Provider& provider, const std::vector<Computer>& computers, const Class& association);

@@ -60,7 +60,7 @@ const CMPIInstance* PropertyList::applied(const CMPIBroker* broker, const CMPIIn
     if (hasAll(owner)) {
         return instance;
     }
-    theGate.pass();
+    requireManager();
     CMPIInstance* made = makeInstance(broker, pathOf(instance));
     // Some managers put all properties of a class into a new instance: this keeps out what nobody asked for.
     // The keys are listed besides: there are managers that do not show what is only named as a key.

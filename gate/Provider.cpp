@@ -5,9 +5,9 @@
 #include "WrappedBroker.h"
 
 #include <algorithm>
-#include <cstddef>
 #include <mutex>
 #include <optional>
+#include <utility>
 
 extern "C" {
 CMPIInstanceMI* LeaseAndWarrantyProvider_Create_InstanceMI(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
@@ -26,7 +26,8 @@ struct Connection {
 };
 
 Connection connection;
-std::size_t removalCount = 0;  // changed by who has the turn
+std::mutex watchMutex;
+Provider::Watch* watches = nullptr;
 
 /** The object manager's broker once the provider is connected to it, with its tables as they were then. */
 struct Manager {
@@ -42,6 +43,12 @@ struct Manager {
 };
 
 Manager connected;
+
+/** Whatever the namespace: the provider has one table a class. */
+bool sameInstance(const OwnPath& one, const OwnPath& other) {
+    constexpr const char* key = "InstanceID";
+    return sameName(classNameOf(one.handle()), classNameOf(other.handle())) && one.key(key) == other.key(key);
+}
 
 void requireOk(const CMPIStatus& status) {
     if (status.rc == CMPI_RC_OK) {
@@ -162,12 +169,29 @@ void Provider::modify(const OwnPath& path, const OwnInstance& instance) const {
 void Provider::remove(const OwnPath& path) const {
     CapturedResult result;
     CMPIInstanceMI* mi = connection.instances;
-    ++removalCount;
+    Watch::tell(path);
     requireOk(mi->ft->deleteInstance(mi, context, &result.handle, path.handle()));
 }
 
-std::size_t Provider::removals() {
-    return removalCount;
+Provider::Watch::Watch(const OwnPath& path) : watched(path) {
+    const std::lock_guard<std::mutex> lock(watchMutex);
+    next = std::exchange(watches, this);
+}
+
+void Provider::Watch::tell(const OwnPath& removed) {
+    const std::lock_guard<std::mutex> lock(watchMutex);
+    for (Watch* watch = watches; watch != nullptr; watch = watch->next) {
+        watch->isRemoved = watch->isRemoved || sameInstance(watch->watched, removed);
+    }
+}
+
+Provider::Watch::~Watch() {
+    const std::lock_guard<std::mutex> lock(watchMutex);
+    Watch** link = &watches;
+    while (*link != this) {
+        link = &(*link)->next;
+    }
+    *link = next;
 }
 
 Provider::Paths Provider::associatorNames(const OwnPath& path, const char* associationClass) const {

@@ -7,7 +7,6 @@
 
 #include <cmpift.h>
 
-#include <cstddef>
 #include <string>
 #include <vector>
 
@@ -49,16 +48,40 @@ public:
     void modify(const OwnPath& path, const OwnInstance& instance) const;
     void remove(const OwnPath& path) const;
 
-    /** How often an instance has been removed, by whomever. */
-    static std::size_t removals();
-
     Paths associatorNames(const OwnPath& path, const char* associationClass) const;
+
+    /** Does some work, of the object manager's, while others may have the turn. Ended when that ends meanwhile. */
+    template <class Work>
+    void letOthersIn(Work work) const {
+        turn.interruptFor(work);
+    }
+
+    class Watch;
 
 private:
     bool isListed(const OwnPath& path) const;
 
-    Turn turn;
+    mutable Turn turn;
     const CMPIContext* context;
+};
+
+/** Tells whether an instance has been removed since, by whomever: for who lets others in. Asked by who has the turn. */
+class Provider::Watch {
+public:
+    explicit Watch(const OwnPath& path);
+    ~Watch();
+    Watch(const Watch&) = delete;
+    Watch& operator=(const Watch&) = delete;
+
+    bool sawRemoval() const { return isRemoved; }
+
+private:
+    friend class Provider;
+    static void tell(const OwnPath& removed);
+
+    const OwnPath& watched;
+    bool isRemoved = false;
+    Watch* next = nullptr;
 };
 
 }  // namespace gate

@@ -10,7 +10,7 @@ namespace {
 
 template <auto function, class... Answer>
 void tellResult(const CMPIResult* result, Answer... answer) {
-    theGate.pass();
+    requireManager();
     const CMPIStatus status = tell<function>(result, answer...);
     require(status.rc == CMPI_RC_OK, "take the answer", status);
 }

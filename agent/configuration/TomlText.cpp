@@ -20,6 +20,10 @@ bool isOneOf(char byte, std::string_view bytes) {
     return bytes.find(byte) != std::string_view::npos;
 }
 
+bool isBlank(char byte) {
+    return byte == ' ' || byte == '\t' || byte == '\r';
+}
+
 /**
  * Whether a byte stands in a value that is neither string nor array nor table, such as a number. In the rest of such a
  * value the parser looks for the end without knowing of strings, in which it would come upon any character.
@@ -37,11 +41,11 @@ public:
         const bool isElement = !isHeader && !nesting.empty() && nesting.back() == '[';
         if (byte == '=' || isOneOf(byte, "[{,\n")) {
             isAwaited = byte == '=' || isElement;
-        } else if (!isOneOf(byte, " \t\r")) {
+        } else if (!isBlank(byte)) {
             isInside = (isInside || isAwaited) && !isOneOf(byte, "]}");
             isAwaited = false;
         }
-        isInside = isInside && !isOneOf(byte, " \t\r\n,");
+        isInside = isInside && !isBlank(byte) && !isOneOf(byte, "\n,");
     }
 
     void followString() { isAwaited = false; }
@@ -89,7 +93,7 @@ private:
         } else {
             skip(1);
             value.follow(byte, last == '\n');
-            last = isOneOf(byte, " \t") ? last : byte;
+            last = byte == ' ' || byte == '\t' ? last : byte;
             dots += byte == '.' ? 1 : 0;
             reason = dots > mostDotsOfALine ? "a key has too many parts" : nullptr;
         }

@@ -115,7 +115,7 @@ RawAnswer ObjectManager::ask(const ServedClass& served, const Request& request) 
 Answer<std::vector<RawAnswer>> ObjectManager::run(Request request) {
     const ProviderPool::Stay stay(pool);
     if (pool.isStopped()) {
-        return {{CMPI_RC_ERR_FAILED, "The object manager is stopping."}, {}};
+        return {{CMPI_RC_ERR_FAILED, stoppingText}, {}};
     }
     if (!providers.knowsNameSpace(request.path.nameSpace)) {
         return {{CMPI_RC_ERR_INVALID_NAMESPACE, "There is no namespace " + request.path.nameSpace + "."}, {}};

@@ -81,6 +81,7 @@ bool ProviderPool::staysWhenIdle(const LoadedLibrary& library) {
 }
 
 void ProviderPool::idle() {
+    const Stay stay(*this);
     const std::lock_guard<ChainMutex> lock(mutex);
     for (auto library = libraries.begin(); library != libraries.end();) {
         const LoadedLibrary* loaded = library->second.get();
@@ -111,7 +112,8 @@ void ProviderPool::unloadLost() {
         return;
     }
     const std::lock_guard<ChainMutex> lock(mutex);
-    for (auto location = lost.begin(); location != lost.end() && staying == 0; location = lost.erase(location)) {
+    for (auto location = lost.begin(); location != lost.end() && staying == 0 && !stopped;
+         location = lost.erase(location)) {
         const auto library = libraries.find(*location);
         if (library != libraries.end()) {
             unload(library);
@@ -119,8 +121,9 @@ void ProviderPool::unloadLost() {
     }
 }
 
-/** A cleanup may wait for requests, which may need the mutex: it is not held then. */
+/** A cleanup may wait for requests, which may need a mutex: none is held then. */
 void ProviderPool::stop() {
+    const Stay stay(*this);
     if (stopped.exchange(true)) {
         return;
     }
@@ -132,8 +135,12 @@ void ProviderPool::stop() {
         }
     }
     for (Provider* provider : all) {
-        end(*provider->library, provider->instance);
-        end(*provider->library, provider->association);
+        std::unique_lock<ChainMutex> lock(guardOf(*provider));
+        CMPIInstanceMI* const instance = provider->instance;
+        CMPIAssociationMI* const association = provider->association;
+        lock.unlock();
+        end(*provider->library, instance);
+        end(*provider->library, association);
     }
 }
 
@@ -166,16 +173,32 @@ ProviderPool::Provider& ProviderPool::provider(const ProviderAddress& address) {
 template <class Interface>
 Interface* ProviderPool::get(const ProviderAddress& address) {
     Provider& found = provider(address);
-    const std::lock_guard<ChainMutex> lock(broker.profile().startsAtOnce ? found.mutex : mutex);
+    const std::lock_guard<ChainMutex> lock(guardOf(found));
     Interface*& interface = member<Interface>(found);
     if (interface == nullptr) {
+        requireRunning();
         if (found.isStarting) {
             throw LibraryError("Provider " + address.provider + " needs itself to start.");
         }
         const Starting starting(found.isStarting);
-        interface = createInterface<Interface>(*found.library, address.provider, broker, broker.handle());
+        Interface* made = createInterface<Interface>(*found.library, address.provider, broker, broker.handle());
+        if (stopped) {
+            end(*found.library, made);
+        }
+        requireRunning();
+        interface = made;
     }
     return interface;
+}
+
+void ProviderPool::requireRunning() const {
+    if (stopped) {
+        throw LibraryError(stoppingText);
+    }
+}
+
+ChainMutex& ProviderPool::guardOf(Provider& provider) {
+    return broker.profile().startsAtOnce ? provider.mutex : mutex;
 }
 
 template CMPIInstanceMI* ProviderPool::get(const ProviderAddress&);

@@ -15,6 +15,9 @@
 
 namespace cimhost {
 
+/** What comes too late is told. */
+constexpr const char* stoppingText = "The object manager is stopping.";
+
 /**
  * The providers in this process. Libraries are loaded and factories called when a provider is first needed, once an
  * interface; after a failure the next need tries again. In the end every interface is cleaned up and every library
@@ -85,6 +88,10 @@ private:
 
     /** Cleans up the providers of a library; whether it stays. */
     bool staysWhenIdle(const LoadedLibrary& library);
+
+    /** What guards the interfaces of a provider. */
+    ChainMutex& guardOf(Provider& provider);
+    void requireRunning() const;
 
     LoadedLibrary& library(const std::string& location);
     Provider& provider(const ProviderAddress& address);

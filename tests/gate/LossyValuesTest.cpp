@@ -112,11 +112,14 @@ TEST_F(LossyValuesTest, DatesThatAreNoneAreTakenAsNoneWhereTheOperatorWantsThat)
         EXPECT_THAT(remove("L1"), isDone());
     }
     const ObjectPath path = gate().enumerateInstanceNames(classPath(asset)).paths().front();
-    for (const char* date : {"20240229000000.000000+000", "00000001000000.000000:000"}) {
-        EXPECT_THAT(gate().modifyInstance(path, testsupport::instance(path, {named("PurchaseDate", dateTime(date))})),
-                    isDone());
+    for (const char* property : {"PurchaseDate", "ZOPMUpdateTime"}) {
+        for (const char* date : {"20240229000000.000000+000", "00000001000000.000000:000"}) {
+            EXPECT_THAT(gate().modifyInstance(path, testsupport::instance(path, {named(property, dateTime(date))})),
+                        isDone())
+                << property << ' ' << date;
+        }
+        EXPECT_EQ(valueIn(only(asset), property), std::nullopt) << "an interval is no date there";
     }
-    EXPECT_EQ(valueIn(only(asset), "PurchaseDate"), std::nullopt) << "an interval is no date there";
     unload();  // before the configuration is as it was
 }
 

@@ -1,7 +1,7 @@
-#include "FullDisk.h"
 #include "GateFixture.h"
 
 #include "support/Files.h"
+#include "support/FullDisk.h"
 
 // What a client is told when its request is refused is about its request, and nobody else's.
 
@@ -10,6 +10,7 @@ namespace {
 
 using testing::HasSubstr;
 using testing::Not;
+using testsupport::FullDisk;
 using Outcomes = std::vector<Outcome>;
 
 /** Of the two clients, the first has stored texts with its name in them wherever a client can. */

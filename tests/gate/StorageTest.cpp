@@ -1,4 +1,3 @@
-#include "FullDisk.h"
 #include "GateFixture.h"
 
 #include "support/Files.h"
@@ -8,7 +7,9 @@
 #include <sys/stat.h>
 #include <sys/statvfs.h>
 #include <cerrno>
+#include <chrono>
 #include <cstdio>
+#include <regex>
 #include <set>
 
 // Changes that cannot be stored.
@@ -35,21 +36,22 @@ struct NoRoom {
     NoRoom& operator=(const NoRoom&) = delete;
 };
 
-/** While one of these lives, files can be opened to be written anew only that many times more. */
-struct FewOpenings {
-    static inline int left = -1;  ///< any number
+/**
+ * While one of these lives, files are opened to be written anew as its course says: '+' for one that is, '-' for one
+ * that is not; the last holds from then on.
+ */
+struct Openings {
+    static inline const char* course = "+";
 
-    explicit FewOpenings(int allowed) { left = allowed; }
-    ~FewOpenings() { left = -1; }
-    FewOpenings(const FewOpenings&) = delete;
-    FewOpenings& operator=(const FewOpenings&) = delete;
+    explicit Openings(const char* itsCourse) { course = itsCourse; }
+    ~Openings() { course = "+"; }
+    Openings(const Openings&) = delete;
+    Openings& operator=(const Openings&) = delete;
 
     static bool take() {
-        if (left > 0) {
-            --left;
-            return true;
-        }
-        return left < 0;
+        const bool isOpened = *course == '+';
+        course += course[1] != '\0' ? 1 : 0;
+        return isOpened;
     }
 };
 
@@ -178,7 +180,7 @@ TEST_F(StorageTest, AFileThatWasNotWrittenIsTold) {
     create("L1", {named("Lessor", text("ACME"))});
     const std::string stored = readFile(dataFile("Lease.dat"));
     for (const char* lessor : {"Other", ""}) {
-        const FewOpenings none(0);
+        const Openings none("-");
         const Outcome outcome = modify("L1", {named("Lessor", text(lessor))});
         EXPECT_THAT(outcome, isRefused(CMPI_RC_ERR_FAILED, "Lease.dat was not written"));
         EXPECT_THAT(outcome.message, testing::Not(HasSubstr("damaged"))) << "it never changed";
@@ -191,7 +193,7 @@ TEST_F(StorageTest, AFileThatWasNotWrittenIsToldAlsoWhereLossyValuesArePermitted
     const RefusalOff permitted;
     create("L1", {named("Lessor", text("A_B"))});
     EXPECT_THAT(modify("L1", {named("Lessor", text("A B"))}), isDone()) << "the same in the file";
-    const FewOpenings none(0);
+    const Openings none("-");
     EXPECT_THAT(modify("L1", {named("Lessor", text("Other"))}),
                 isRefused(CMPI_RC_ERR_FAILED, "Lease.dat was not written"));
     EXPECT_EQ(valueIn(got("L1"), "Lessor"), "A B");
@@ -200,7 +202,7 @@ TEST_F(StorageTest, AFileThatWasNotWrittenIsToldAlsoWhereLossyValuesArePermitted
 TEST_F(StorageTest, WhatTheFileKeepsOfAChangeThatIsTakenBackIsTold) {
     create("L1");
     {
-        const FewOpenings one(1);
+        const Openings first("+-");
         EXPECT_THAT(create("L2", {named("Lessor", text("ACME"))}),
                     isRefused(CMPI_RC_ERR_FAILED, "Lease.dat stays damaged until the next change succeeds"));
     }
@@ -208,6 +210,27 @@ TEST_F(StorageTest, WhatTheFileKeepsOfAChangeThatIsTakenBackIsTold) {
     EXPECT_THAT(readFile(dataFile("Lease.dat")), HasSubstr("L2\n")) << "it would be back after a restart";
     EXPECT_THAT(modify("L1", {named("LeaseTerm", uint32(1))}), isDone());
     EXPECT_THAT(readFile(dataFile("Lease.dat")), testing::Not(HasSubstr("L2\n")));
+}
+
+TEST_F(StorageTest, ADeletionThatIsTakenBackInPartIsTold) {
+    create("L1", {named("Lessor", text("ACME"))});
+    {
+        const Openings second("-+-");
+        EXPECT_THAT(remove("L1"), isRefused(CMPI_RC_ERR_FAILED, "Lease.dat stays damaged until the next change"));
+    }
+    EXPECT_EQ(valueIn(got("L1"), "Lessor"), "ACME") << "in memory";
+    EXPECT_THAT(modify("L1", {named("LeaseTerm", uint32(1))}), isDone());
+    EXPECT_THAT(readFile(dataFile("Lease.dat")), HasSubstr("ACME\n"));
+}
+
+TEST_F(StorageTest, AChangeToWhatTheFileHasAlreadyIsAChange) {
+    create("L1", {named("Lessor", text("ACME"))});
+    const auto byHand = std::regex_replace(readFile(dataFile("Lease.dat")), std::regex("ACME"), "Other");
+    testsupport::writeFile(dataFile("Lease.dat"), byHand);
+    fs::last_write_time(dataFile("Lease.dat"), fs::file_time_type::clock::now() - std::chrono::hours(1));
+    EXPECT_THAT(modify("L1", {named("Lessor", text("Other"))}), isDone());
+    EXPECT_EQ(valueIn(got("L1"), "Lessor"), "Other");
+    EXPECT_EQ(readFile(dataFile("Lease.dat")), byHand);
 }
 
 TEST_F(StorageTest, WithoutRoomNothingIsTouched) {
@@ -264,7 +287,7 @@ namespace {
 /** Opens a file, or says that there are too many open ones. */
 FILE* openIfAllowed(const char* function, const char* path, const char* mode) {
     using Function = FILE* (*)(const char*, const char*);
-    if (*mode == 'w' && !gatetest::FewOpenings::take()) {
+    if (*mode == 'w' && !gatetest::Openings::take()) {
         errno = EMFILE;
         return nullptr;
     }

@@ -11,6 +11,7 @@
 #include <atomic>
 #include <chrono>
 #include <condition_variable>
+#include <functional>
 #include <mutex>
 #include <string>
 #include <thread>
@@ -172,9 +173,9 @@ TEST(TurnTest, WhoComesBackFromAPauseWaitsForWhoIsInside) {
 
 /** Goes on when the gate closes, whether or not it is shut. */
 void awaitClosing(Gate& gate) {
-    for (bool isOpen = true; isOpen; std::this_thread::yield()) {
-        isOpen = gate.arrive();
+    while (gate.arrive()) {
         gate.depart();
+        std::this_thread::yield();
     }
 }
 
@@ -184,7 +185,6 @@ TEST(TurnTest, AClosedGateLetsNobodyIn) {
     gate.depart();
     EXPECT_TRUE(gate.close(longEnough));
     EXPECT_FALSE(gate.arrive());
-    gate.depart();
     EXPECT_FALSE(gate.close(longEnough)) << "it was closed before";
 }
 
@@ -285,28 +285,54 @@ TEST(TurnTest, WhoComesBackToAShutGateWaitsForItToBeOpened) {
     gate.depart();
 }
 
-TEST(TurnTest, WhoPassesWaitsWhileTheGateIsShutOnly) {
+TEST(TurnTest, WhoResumesHasItsTurnAgainUnlessTheGateIsShut) {
+    Gate gate;
+    ASSERT_TRUE(gate.arrive());
+    ASSERT_TRUE(gate.enter());
+    gate.leave();
+    EXPECT_TRUE(gate.resume());
+    gate.leave();
+    gate.depart();
+    EXPECT_FALSE(gate.isShut());
+    EXPECT_TRUE(gate.close(longEnough));
+    EXPECT_TRUE(gate.isShut());
+    EXPECT_FALSE(gate.resume());
+    EXPECT_TRUE(gate.open());
+    EXPECT_TRUE(gate.enter()) << "who was sent away has no turn";
+    gate.leave();
+}
+
+TEST(TurnTest, WhoWaitsToResumeIsSentAwayByTheEndAndWhoComesBackIsNot) {
     Gate gate;
     Diary diary;
-    gate.pass();
-    std::thread late([&] {
+    std::vector<std::thread> threads;
+    const auto request = [&](const std::string& name, const std::function<bool()>& again) {
         gate.arrive();
-        diary.note("arrived");
-        diary.await("shut");
-        gate.pass();
-        diary.note("passed");
+        EXPECT_TRUE(gate.enter());
+        gate.leave();
+        diary.note(name + " pausing");
+        diary.await("ending");
+        diary.note(name + (again() ? " back" : " away"));
         gate.depart();
+    };
+    threads.emplace_back(request, "first", [&] { return gate.resume(); });
+    threads.emplace_back(request, "second", [&] {
+        gate.comeBack();
+        gate.leave();
+        return true;
     });
-    diary.await("arrived");
-    EXPECT_TRUE(gate.close(std::chrono::seconds(0)));
-    diary.note("shut");
-    awaitQueue(gate, 1);
+    diary.await("first pausing");
+    diary.await("second pausing");
+    EXPECT_TRUE(gate.close(std::chrono::seconds(0), Gate::Closing::untilOpened, [&] {
+        diary.note("ending");
+        awaitQueue(gate, 2);
+    }));
+    diary.await("first away");
+    EXPECT_EQ(gate.waiting(), 1U);
     diary.note("opened");
     EXPECT_TRUE(gate.open());
-    late.join();
-    EXPECT_THAT(diary.all(), ElementsAre("arrived", "shut", "opened", "passed"));
-    EXPECT_TRUE(gate.enter()) << "who passes keeps no turn";
-    gate.leave();
+    join(threads);
+    EXPECT_EQ(diary.all().back(), "second back");
 }
 
 TEST(TurnTest, TheEndComesBeforeTheGateIsShutAndNobodyElseIsInside) {
@@ -345,13 +371,17 @@ TEST(TurnTest, WhoWaitedToCloseDoesNotShutAGateThatWasOpenedSince) {
     for (int number = 0; number < 4; ++number) {
         threads.emplace_back([&] { gate.close(longEnough, Gate::Closing::untilOpened, [&] { ++ends; }); });
     }
-    awaitClosing(gate);
+    while (gate.closing() < 4) {
+        std::this_thread::yield();
+    }
     gate.depart();
     while (!gate.open()) {
         std::this_thread::yield();
     }
     join(threads);
-    EXPECT_TRUE(ends > 1 || gate.arrive()) << "a closer that came after the opening may shut it";
+    EXPECT_EQ(ends, 1);
+    EXPECT_TRUE(gate.arrive());
+    gate.depart();
 }
 
 TEST(TurnTest, OthersThanTheCallerAreToldOf) {
@@ -364,6 +394,14 @@ TEST(TurnTest, OthersThanTheCallerAreToldOf) {
         gate.arrive();
     }).join();
     EXPECT_TRUE(gate.hasOthers());
+    gate.depart();
+}
+
+TEST(TurnTest, WhoWasNotLetInIsNotWaitedFor) {
+    Gate gate;
+    EXPECT_TRUE(gate.close(longEnough));
+    std::thread([&] { EXPECT_FALSE(gate.arrive()); }).join();
+    EXPECT_FALSE(gate.hasOthers());
 }
 
 TEST(TurnTest, AGateThatIsClosedForGoodIsNotOpenedAgain) {
@@ -372,7 +410,6 @@ TEST(TurnTest, AGateThatIsClosedForGoodIsNotOpenedAgain) {
     gate.close(longEnough, Gate::Closing::forGood);
     EXPECT_FALSE(gate.open());
     EXPECT_FALSE(gate.arrive());
-    gate.depart();
 }
 
 TEST(TurnTest, SeveralMayCloseTheGateAtATimeAndOneOfThemDoes) {
