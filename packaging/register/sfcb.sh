@@ -81,31 +81,40 @@ sfcb_save() {
         complain "SFCB: $sfcb_place cannot be written to; is there another --sfcb-directory?"
         return 1
     }
-    trap 'sfcb_put_back; exit 1' HUP INT TERM
+    trap 'sfcb_leave "it was to end"; exit 1' HUP INT TERM
     for each in stage registration; do
         [ ! -e "$sfcb_place/$each" ] || cp -aH "$sfcb_place/$each" "$sfcb_copies/" || {
-            sfcb_discard
-            complain "SFCB: nothing is changed, since no copy could be made of $sfcb_place/$each"
+            sfcb_leave "no copy could be made of $sfcb_place/$each"
             return 1
         }
     done
+    trap 'sfcb_put_back; exit 1' HUP INT TERM
 }
 
+# The originals are as they were, and the copies may not be whole.
+sfcb_leave() { # REASON
+    sfcb_discard
+    complain "SFCB: nothing is changed, since $1"
+}
+
+# A signal finds the copies whole, or is ignored.
 sfcb_discard() {
-    [ "$dry_run" = yes ] || rm -rf "$sfcb_copies"
+    [ "$dry_run" = no ] || return 0
+    trap '' HUP INT TERM
+    rm -rf "$sfcb_copies"
     trap - HUP INT TERM
 }
 
 # Another run of sfcbrepos would not do: after a first that broke off, it deletes the last good repository.
 sfcb_put_back() {
-    for each in stage registration; do
-        sfcb_put_back_one "$each" || {
-            complain "SFCB: what was there could not be put back: it is in $sfcb_copies"
-            return
-        }
-    done
-    complain "SFCB: what was there before has been put back"
-    sfcb_discard
+    trap '' HUP INT TERM
+    if sfcb_put_back_one stage && sfcb_put_back_one registration; then
+        complain "SFCB: what was there before has been put back"
+        sfcb_discard
+    else
+        complain "SFCB: what was there could not be put back: it is in $sfcb_copies"
+        trap - HUP INT TERM
+    fi
 }
 
 sfcb_put_back_one() {
