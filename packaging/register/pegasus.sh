@@ -63,22 +63,29 @@ pegasus_remove_modules() {
     done
 }
 
-pegasus_load_providers() { # LIBRARY
-    run cimmof -n root/PG_InterOp "$data/pegasus/$1.mof" || return 1
-    if has_computers; then
-        run cimmof -n root/PG_InterOp "$data/pegasus/$computers.mof"
-    fi
+pegasus_load_provider() { # LIBRARY
+    run cimmof -n root/PG_InterOp "$data/pegasus/$1.mof"
 }
 
-# A provider's place is taken when the former one is gone. It comes back where the new one is refused.
-pegasus_replace() {
-    pegasus_load_classes && pegasus_remove_modules || return 1
-    pegasus_load_providers "$library" && return
-    if [ -n "$former" ]; then
-        complain "OpenPegasus: trying to register $former again"
-        pegasus_remove_modules && pegasus_load_providers "$former"
-    fi
+# A provider's place is taken when the former one is gone. It comes back where that or the new one fails.
+pegasus_replace() { # FORMER: module and provider, a line each
+    pegasus_load_classes || return 1
+    pegasus_remove_modules && pegasus_load_provider "$library" &&
+        { ! has_computers || pegasus_load_provider "$computers"; } && return
+    [ -z "$1" ] || pegasus_put_back "$1"
     return 1
+}
+
+# What cannot be removed is not registered over.
+pegasus_put_back() { # FORMER
+    pegasus_remove_modules
+    left=$(pegasus_modules) || return
+    printf '%s\n' "$1" | while read -r module name; do
+        if ! printf '%s\n' "$left" | grep -qx "$module"; then
+            complain "OpenPegasus: trying to register $name again"
+            pegasus_load_provider "$name"
+        fi
+    done
 }
 
 pegasus_look_for_library() {
@@ -92,12 +99,13 @@ pegasus_look_for_library() {
 
 register_pegasus() {
     pegasus_server || return
-    choose_library "$(pegasus_registered)" || {
+    before=$(pegasus_registered)
+    choose_library "$before" || {
         say "OpenPegasus: nothing was registered, and nothing is renewed"
         return
     }
     pegasus_find_other_computers
-    if pegasus_replace; then
+    if pegasus_replace "$before"; then
         registered_with=$registered_with,pegasus
         done_saying "OpenPegasus: registered $library"
         pegasus_look_for_library
