@@ -64,7 +64,7 @@ verify() {
         exit 4
     fi
     split_url
-    for class in $(classes_of "$gate") $(! has_computers || classes_of "$computers"); do
+    for class in $(all_classes); do
         verify_class "$class"
     done
 }
