@@ -74,7 +74,8 @@ sfcb_register_all() {
     fi
 }
 
-# Copies lie beside the originals, so that putting them back is renaming, which takes no space.
+# Copies lie beside the originals, so that putting them back is renaming, which takes no space; unless an original is a
+# link to another file system.
 sfcb_save() {
     [ "$dry_run" = no ] || return 0
     sfcb_copies=$(mktemp -d "$sfcb_place/before-$program.XXXXXX") || {
@@ -117,11 +118,13 @@ sfcb_put_back() {
     fi
 }
 
-sfcb_put_back_one() {
-    if [ -e "$sfcb_place/$1" ]; then
-        mv "$sfcb_place/$1" "$sfcb_copies/failed-$1" || return 1
+# Where the original is a link, it stays one.
+sfcb_put_back_one() { # DIRECTORY
+    original=$(readlink -f "$sfcb_place/$1") || return 1
+    if [ -e "$original" ]; then
+        mv "$original" "$sfcb_copies/failed-$1" || return 1
     fi
-    [ ! -e "$sfcb_copies/$1" ] || mv "$sfcb_copies/$1" "$sfcb_place/$1"
+    [ ! -e "$sfcb_copies/$1" ] || mv "$sfcb_copies/$1" "$original"
 }
 
 # Does a step with what is staged, and makes the repository of it.
