@@ -78,7 +78,7 @@ TEST_P(KillTest, EveryPointLeavesAssetDataWholeAndOfRecordsTheBeginningInWholeLi
 INSTANTIATE_TEST_SUITE_P(Requests, KillTest, testing::ValuesIn(changingRequests()),
                          [](const auto& tested) { return tested.param.name; });
 
-TEST(ProcessTest, EndsWithItsWork) {
+TEST(KillProcessTest, EndsWithItsWork) {
     EXPECT_FALSE(isKilled([] {}));
     EXPECT_THROW(isKilled([] { throw std::runtime_error("on the way"); }), std::runtime_error);
 }
