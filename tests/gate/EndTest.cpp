@@ -109,7 +109,7 @@ protected:
         EXPECT_EQ(broker.count("CMPIEnumerationFT.hasNext"), 0) << "the first call after the up-call";
         EXPECT_EQ(broker.count("CMPIBrokerEncFT.newString"), 0);
         close();
-        EXPECT_TRUE(isLoaded(GATE_LIBRARY)) << "a request may still have been in it";
+        EXPECT_TRUE(isLoaded(testsupport::underTest(GATE_LIBRARY))) << "a request may still have been in it";
         std::_Exit(testing::Test::HasFailure() ? 1 : 0);
     }
 

@@ -4,6 +4,7 @@
 #include "operations/Interpretation.h"
 #include "schema/MofReader.h"
 #include "support/Files.h"
+#include "support/UnderTest.h"
 
 #include <regex>
 
@@ -19,7 +20,7 @@ cimhost::ObjectManagerOptions optionsOf(cimhost::Manager manager) {
     cimhost::Schema schema;
     cimhost::MofReader(schema).readFile(SCHEMA_MOF);
     cimhost::ObjectManagerOptions options;
-    options.libraries.searchPath = {LIBRARIES};
+    options.libraries.searchPath = {std::filesystem::path(testsupport::underTest(GATE_LIBRARY)).parent_path()};
     options.classShape = cimhost::classShapes(schema);
     options.manager = manager;
     return options;

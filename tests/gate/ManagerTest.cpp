@@ -1,5 +1,6 @@
 #include "ManagedGate.h"
 #include "support/Managers.h"
+#include "support/UnderTest.h"
 
 // Whole lives of instances, under object managers as they are.
 
@@ -52,7 +53,7 @@ TEST_P(ManagerTest, StaysWithItsTablesWhileIdle) {
     expectStatus(gate.create("A1", {named("Lessor", text("ACME"))}), CMPI_RC_OK);
     testsupport::writeFile(agentEnvironment::dataDirectory() / "Lease.dat", "");
     gate.manager().idle();
-    EXPECT_TRUE(isLoaded(GATE_LIBRARY));
+    EXPECT_TRUE(isLoaded(testsupport::underTest(GATE_LIBRARY)));
     EXPECT_THAT(gate.identifiers(lease), ElementsAre("A1")) << "the file is not read again";
 }
 

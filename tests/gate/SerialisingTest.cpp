@@ -10,6 +10,7 @@
 #include "ManagedGate.h"
 #include "Threads.h"
 #include "support/Files.h"
+#include "support/UnderTest.h"
 
 // How many requests are inside the provider at a time.
 
@@ -107,7 +108,7 @@ protected:
     ~SerialisingTest() override { agentEnvironment::clear(); }
 
     /** All clients enumerate the one warranty at a time. */
-    void load(const char* file, const char* name, int insideAtOnce) {
+    void load(const std::string& file, const char* name, int insideAtOnce) {
         testsupport::RecordingBroker broker;
         InsideCounter counter(*broker.handle());
         counter.awaitedInside = insideAtOnce;
@@ -130,18 +131,18 @@ protected:
 };
 
 TEST_F(SerialisingTest, ThroughTheGateOneRequestAtATimeIsInside) {
-    load(GATE_LIBRARY, "LeaseAndWarrantyGate", 1);
+    load(testsupport::underTest(GATE_LIBRARY), "LeaseAndWarrantyGate", 1);
 }
 
 TEST_F(SerialisingTest, WithoutItAllRequestsAreInsideAtOnce) {
-    load(PROVIDER_LIBRARY, "LeaseAndWarrantyProvider", clientCount);
+    load(testsupport::underTest(PROVIDER_LIBRARY), "LeaseAndWarrantyProvider", clientCount);
 }
 
 TEST_F(SerialisingTest, AFactoryCallDoesNotWaitForWhoIsInside) {
     testsupport::RecordingBroker broker;
     InsideCounter counter(*broker.handle());
     counter.awaitedComing = 1;
-    testsupport::ProviderLibrary library(GATE_LIBRARY, "LeaseAndWarrantyGate", broker);
+    testsupport::ProviderLibrary library(testsupport::underTest(GATE_LIBRARY), "LeaseAndWarrantyGate", broker);
     CMPIInstanceMI* first = library.createInstanceMI(counter.handle(), nullptr);
     std::thread request([&] { EXPECT_THAT(library.enumerateInstances(classPath(warranty)), isAnswered(1)); });
     counter.awaitInside();
@@ -166,7 +167,8 @@ struct EndWhileInside {
                 std::_Exit(9);
             }
         });
-        static auto* library = new testsupport::ProviderLibrary(GATE_LIBRARY, "LeaseAndWarrantyGate", broker);
+        static auto* library =
+            new testsupport::ProviderLibrary(testsupport::underTest(GATE_LIBRARY), "LeaseAndWarrantyGate", broker);
         library->createInstanceMI(inside.handle(), nullptr);
         // Before them.
         std::atexit([] { counter->comes(); });
