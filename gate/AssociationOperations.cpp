@@ -21,12 +21,14 @@ bool isOrAny(const char* asked, const char* name) {
 }
 
 /** Whether a path's class is the class or, as the object manager knows, a subclass of it. */
-bool isA(const CMPIBroker* broker, const CMPIObjectPath* path, const char* className) {
+bool isA(const Request& request, const CMPIObjectPath* path, const char* className) {
+    request.requireManager();
     const std::string pathsClass = classNameOf(path);
     if (sameName(pathsClass, className)) {
         return true;
     }
     // The classes of the MOF do not descend from each other: the object manager need not be asked.
+    const CMPIBroker* broker = request.broker;
     const bool areBothKnown = findClass(pathsClass) != nullptr && findClass(className) != nullptr;
     if (areBothKnown || broker->eft == nullptr || broker->eft->classPathIsA == nullptr) {
         return false;
@@ -65,7 +67,7 @@ std::vector<Way> waysFrom(const Request& request, const AssociationFilter& filte
         const Property* other = one + 1;
         for (const Way& way : {Way{&association, one, other}, Way{&association, other, one}}) {
             if (isOrAny(filter.role, way.near->name) && isOrAny(filter.resultRole, way.far->name) &&
-                isA(request.broker, request.path, way.near->referenceClass)) {
+                isA(request, request.path, way.near->referenceClass)) {
                 ways.push_back(way);
             }
         }
@@ -109,12 +111,13 @@ void follow(const Request& request, const AssociationFilter& filter, Take take) 
 template <class Answer, class PathOf>
 void restrict(const Request& request, const char* resultClass, std::vector<Answer>& answers, PathOf pathOfAnswer) {
     const auto isOther = [&](const Answer& answer) {
-        return !isAny(resultClass) && !isA(request.broker, pathOfAnswer(answer), resultClass);
+        return !isAny(resultClass) && !isA(request, pathOfAnswer(answer), resultClass);
     };
     answers.erase(std::remove_if(answers.begin(), answers.end(), isOther), answers.end());
 }
 
 const CMPIObjectPath* associationPath(const Request& request, const Class& association, const Link& link) {
+    request.requireManager();
     CMPIObjectPath* path = makePath(request.broker, nameSpaceOf(request.path), association.name);
     for (const Property& end : association) {
         addReference(path, end.name, isComputerEnd(end) ? link.computerPath : link.element);
@@ -181,7 +184,7 @@ void associators(const Request& request, const AssociationFilter& filter, const 
         const CMPIInstance* instance = isComputerEnd(*way.far) ? link.computer : elementOf(provider, way, link);
         const Class* farClass = findClass(way.far->referenceClass);
         if (instance != nullptr) {
-            answers.push_back(list.applied(request.broker, instance, *farClass));
+            answers.push_back(list.applied(request, instance, *farClass));
         }
     });
     restrict(request, filter.resultClass, answers, pathOf);

@@ -8,6 +8,7 @@
 #include <dlfcn.h>
 
 #include <chrono>
+#include <cstddef>
 #include <exception>
 
 namespace gate {
@@ -84,6 +85,7 @@ public:
     Visit& operator=(const Visit&) = delete;
 
     const bool isLetIn;
+    const std::size_t round = theGate.round();
 };
 
 template <class Operation>
@@ -94,7 +96,7 @@ CMPIStatus serve(const CMPIContext* context, const CMPIResult* result, const CMP
     if (!visit.isLetIn || broker == nullptr) {
         return statusOf(CMPI_RC_ERR_FAILED, closed);
     }
-    return guarded(Provider::manager, [&] { operation(Request{broker, context, result, path}); });
+    return guarded(Provider::manager, [&] { operation(Request{broker, context, result, path, visit.round}); });
 }
 
 /** Keeps this library and those that it needs in the process: a request that stays at the gate is in them. */

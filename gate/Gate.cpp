@@ -55,9 +55,9 @@ void Gate::comeBack() noexcept {
     waitForTurn(lock, WhenShut::wait);
 }
 
-bool Gate::resume() noexcept {
+bool Gate::resume(std::size_t round) noexcept {
     std::unique_lock<std::mutex> lock(mutex);
-    return waitForTurn(lock, WhenShut::goAway);
+    return timesShut == round && waitForTurn(lock, WhenShut::goAway);
 }
 
 bool Gate::waitForTurn(std::unique_lock<std::mutex>& lock, WhenShut whenShut) {

@@ -43,11 +43,11 @@ public:
     void leave() noexcept;
     /** Waits for the turn after a leave() that only interrupted it; also while the gate is shut. */
     void comeBack() noexcept;
-    /** The same, but false, and no turn, when the gate is shut. */
-    bool resume() noexcept;
+    /** The same, but false, and no turn, once the gate has been shut since that round. */
+    bool resume(std::size_t round) noexcept;
 
-    /** Whether the gate is shut: the object manager has gone. */
-    bool isShut() const noexcept { return state == State::shut; }
+    /** How often the gate has been shut. Who goes on in another round than it came has lost its object manager. */
+    std::size_t round() const noexcept { return timesShut; }
 
     /**
      * Shuts the gate when nobody is inside or waits to be, but for the calling thread. Before that it gives the
@@ -92,7 +92,7 @@ private:
 
     mutable std::mutex mutex{};
     std::atomic<State> state{State::open};  ///< changed by who has the lock
-    std::size_t timesShut = 0;
+    std::atomic<std::size_t> timesShut{0};
     bool isForGood = false;
     bool isTaken = false;
     std::size_t arrived = 0;
@@ -104,9 +104,9 @@ private:
 /** The gate of this library: there is one provider behind it. */
 extern Gate theGate;
 
-/** Ended when the gate is shut: for who is about to call the object manager without a turn. */
-inline void requireManager() {
-    if (theGate.isShut()) {
+/** Ended when the gate has been shut since that round: for who is about to call its manager without a turn. */
+inline void requireManagerOf(std::size_t round) {
+    if (theGate.round() != round) {
         throw Ended{};
     }
 }
@@ -158,7 +158,7 @@ public:
 
 private:
     void resume() {
-        isHeld = theGate.resume();
+        isHeld = theGate.resume(round);
         if (!isHeld) {
             throw Ended{};
         }
@@ -166,6 +166,7 @@ private:
 
     Uncancelled uncancelled;
     bool isHeld;
+    const std::size_t round = theGate.round();  ///< with the turn, it is still that of the request
 };
 
 /** Interrupts the turn that the caller has, while it lives: for what cannot end there, in the middle of a provider. */

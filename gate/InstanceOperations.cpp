@@ -260,7 +260,7 @@ void enumerateInstances(const Request& request, const char** properties) {
     }
     const OwnPath classPath(nameSpaceOf(request.path), requested.name);
     Provider::Instances instances = Provider(request).instances(classPath);
-    PropertyList(properties).apply(request.broker, instances, requested);
+    PropertyList(properties).apply(request, instances, requested);
     request.giveAll(instances);
 }
 
@@ -271,7 +271,7 @@ void getInstance(const Request& request, const char** properties) {
     }
     const OwnPath path = namingPath(request.path, requested);
     const CMPIInstance* instance = existing(Provider(request), path, requested);
-    request.give(PropertyList(properties).applied(request.broker, instance, requested));
+    request.give(PropertyList(properties).applied(request, instance, requested));
     request.finish();
 }
 

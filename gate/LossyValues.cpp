@@ -30,9 +30,9 @@ constexpr Rule textRules[] = {
     {[](std::string_view text) { return text.find('_') != std::string_view::npos; }, true,
      "an underscore comes back as a blank"},
     {hasWhiteSpace, true, "a tab or line break tears the data file's records apart"},
-    {hasOuterBlank, true, "a blank at an end is lost"},
+    {hasOuterBlank, true, "object managers take blanks off its ends"},
     {[](std::string_view text) { return text.find("  ") != std::string_view::npos; }, true,
-     "blanks one after another are lost"},
+     "blanks one after another may become one on their way to and from clients"},
     {[](std::string_view text) { return text == "*"; }, false, "\"*\" stands for no text"},
     {[](std::string_view text) { return text.size() == 1; }, false, "a text of one character is lost"},
 };

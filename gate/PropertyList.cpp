@@ -1,7 +1,6 @@
 #include "PropertyList.h"
 
 #include "Calls.h"
-#include "Gate.h"
 #include "Objects.h"
 
 #include <algorithm>
@@ -55,13 +54,13 @@ void PropertyList::requireKnown(const Class& owner) const {
     }
 }
 
-const CMPIInstance* PropertyList::applied(const CMPIBroker* broker, const CMPIInstance* instance,
+const CMPIInstance* PropertyList::applied(const Request& request, const CMPIInstance* instance,
                                           const Class& owner) const {
     if (hasAll(owner)) {
         return instance;
     }
-    requireManager();
-    CMPIInstance* made = makeInstance(broker, pathOf(instance));
+    request.requireManager();
+    CMPIInstance* made = makeInstance(request.broker, pathOf(instance));
     // Some managers put all properties of a class into a new instance: this keeps out what nobody asked for.
     // The keys are listed besides: there are managers that do not show what is only named as a key.
     std::vector<const char*> keys = keysOf(owner);
@@ -84,10 +83,10 @@ const CMPIInstance* PropertyList::applied(const CMPIBroker* broker, const CMPIIn
     return made;
 }
 
-void PropertyList::apply(const CMPIBroker* broker, std::vector<const CMPIInstance*>& instances,
+void PropertyList::apply(const Request& request, std::vector<const CMPIInstance*>& instances,
                          const Class& owner) const {
     for (const CMPIInstance*& instance : instances) {
-        instance = applied(broker, instance, owner);
+        instance = applied(request, instance, owner);
     }
 }
 

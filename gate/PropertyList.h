@@ -1,5 +1,6 @@
 #pragma once
 
+#include "Request.h"
 #include "Schema.h"
 
 #include <cmpift.h>
@@ -25,10 +26,10 @@ public:
     void requireKnown(const Class& owner) const;
 
     /** The instance with its keys and what is on the list: itself, or a new one when something has to go. */
-    const CMPIInstance* applied(const CMPIBroker* broker, const CMPIInstance* instance, const Class& owner) const;
+    const CMPIInstance* applied(const Request& request, const CMPIInstance* instance, const Class& owner) const;
 
     /** The same for each of the instances, all of one class. */
-    void apply(const CMPIBroker* broker, std::vector<const CMPIInstance*>& instances, const Class& owner) const;
+    void apply(const Request& request, std::vector<const CMPIInstance*>& instances, const Class& owner) const;
 
 private:
     const char** names;

@@ -1,7 +1,6 @@
 #include "Request.h"
 
 #include "Calls.h"
-#include "Gate.h"
 #include "Objects.h"
 
 namespace gate {
@@ -9,9 +8,9 @@ namespace gate {
 namespace {
 
 template <auto function, class... Answer>
-void tellResult(const CMPIResult* result, Answer... answer) {
-    requireManager();
-    const CMPIStatus status = tell<function>(result, answer...);
+void tellResult(const Request& request, Answer... answer) {
+    request.requireManager();
+    const CMPIStatus status = tell<function>(request.result, answer...);
     require(status.rc == CMPI_RC_OK, "take the answer", status);
 }
 
@@ -27,15 +26,15 @@ const Class& Request::requestedClass() const {
 }
 
 void Request::give(const CMPIInstance* instance) const {
-    tellResult<&CMPIResultFT::returnInstance>(result, instance);
+    tellResult<&CMPIResultFT::returnInstance>(*this, instance);
 }
 
 void Request::give(const CMPIObjectPath* answer) const {
-    tellResult<&CMPIResultFT::returnObjectPath>(result, answer);
+    tellResult<&CMPIResultFT::returnObjectPath>(*this, answer);
 }
 
 void Request::finish() const {
-    tellResult<&CMPIResultFT::returnDone>(result);
+    tellResult<&CMPIResultFT::returnDone>(*this);
 }
 
 }  // namespace gate

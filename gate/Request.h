@@ -1,9 +1,11 @@
 #pragma once
 
+#include "Gate.h"
 #include "Schema.h"
 
 #include <cmpift.h>
 
+#include <cstddef>
 #include <vector>
 
 namespace gate {
@@ -17,6 +19,10 @@ struct Request {
     const CMPIContext* context;
     const CMPIResult* result;
     const CMPIObjectPath* path;
+    std::size_t round;  ///< of the gate, in which it came
+
+    /** Ended when the object manager has ended since: for who has no turn. */
+    void requireManager() const { requireManagerOf(round); }
 
     /** The path's class; CMPI_RC_ERR_INVALID_CLASS when it is none that the provider serves. */
     const Class& requestedClass() const;

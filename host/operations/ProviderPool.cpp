@@ -136,18 +136,19 @@ void ProviderPool::stop() {
     }
     for (Provider* provider : all) {
         std::unique_lock<ChainMutex> lock(guardOf(*provider));
+        LoadedLibrary* const library = provider->library;
         CMPIInstanceMI* const instance = provider->instance;
         CMPIAssociationMI* const association = provider->association;
         lock.unlock();
-        end(*provider->library, instance);
-        end(*provider->library, association);
+        end(library, instance);
+        end(library, association);
     }
 }
 
 template <class Interface>
-void ProviderPool::end(LoadedLibrary& library, Interface* interface) {
+void ProviderPool::end(LoadedLibrary* library, Interface* interface) {
     if (interface != nullptr && asksToStay(cleanUp(interface, broker, true))) {
-        library.keep();
+        library->keep();
     }
 }
 
@@ -183,7 +184,7 @@ Interface* ProviderPool::get(const ProviderAddress& address) {
         const Starting starting(found.isStarting);
         Interface* made = createInterface<Interface>(*found.library, address.provider, broker, broker.handle());
         if (stopped) {
-            end(*found.library, made);
+            end(found.library, made);
         }
         requireRunning();
         interface = made;

@@ -79,8 +79,9 @@ private:
 
     using Libraries = std::map<std::string, std::unique_ptr<LoadedLibrary>>;  ///< by location
 
+    /** @param library null only where there is no interface either */
     template <class Interface>
-    void end(LoadedLibrary& library, Interface* interface);
+    void end(LoadedLibrary* library, Interface* interface);
 
     /** Closes a library, and forgets its providers. */
     Libraries::iterator unload(Libraries::iterator library);

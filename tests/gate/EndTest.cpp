@@ -92,7 +92,7 @@ protected:
     }
 
     /** Ends the process: with 0 if all goes as it should. */
-    [[noreturn]] void outlastTheEnd() {
+    [[noreturn]] void outlastTheEnd(bool isOpenedAgain) {
         create(firstPlace);
         WaitingBroker waiting(*broker.handle());
         gate().createInstanceMI(waiting.handle(), nullptr);
@@ -103,9 +103,16 @@ protected:
         });
         waiting.awaitArrival();
         EXPECT_THAT(gate().cleanupInstanceMI(true), isDone());
+        testsupport::RecordingBroker other;
+        if (isOpenedAgain) {
+            EXPECT_NE(gate().createInstanceMI(other.handle(), nullptr), nullptr);
+            EXPECT_THAT(identifiers(), ElementsAre(firstPlace)) << "the next manager is served";
+        }
         broker.forget();
+        other.forget();
         waiting.release();
         request.join();
+        EXPECT_THAT(other.functions(), IsEmpty());
         EXPECT_EQ(broker.count("CMPIEnumerationFT.hasNext"), 0) << "the first call after the up-call";
         EXPECT_EQ(broker.count("CMPIBrokerEncFT.newString"), 0);
         close();
@@ -195,10 +202,15 @@ TEST_F(EndTest, ARequestInAnUpCallIsServedWhenTheManagerEnds) {
     unload();
 }
 
-/** In a process of its own, since the library stays in it. Waits as long as the gate has patience: some seconds. */
+/** In processes of their own, since the library stays in them. Both wait as long as the gate has patience. */
 TEST_F(EndTest, ARequestWhoseUpCallOutlastsTheEndIsRefusedWithoutACallOfTheBroker) {
     testing::FLAGS_gtest_death_test_style = "threadsafe";
-    EXPECT_EXIT(outlastTheEnd(), testing::ExitedWithCode(0), "");
+    EXPECT_EXIT(outlastTheEnd(false), testing::ExitedWithCode(0), "");
+}
+
+TEST_F(EndTest, ARequestWhoseUpCallOutlastsTheEndIsRefusedAlsoAfterTheNextManagerHasCome) {
+    testing::FLAGS_gtest_death_test_style = "threadsafe";
+    EXPECT_EXIT(outlastTheEnd(true), testing::ExitedWithCode(0), "");
 }
 
 TEST_F(EndTest, AFactoryWhileTheManagerEndsGivesNothingAndSaysWhy) {

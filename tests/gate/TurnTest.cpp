@@ -285,19 +285,20 @@ TEST(TurnTest, WhoComesBackToAShutGateWaitsForItToBeOpened) {
     gate.depart();
 }
 
-TEST(TurnTest, WhoResumesHasItsTurnAgainUnlessTheGateIsShut) {
+TEST(TurnTest, WhoResumesHasItsTurnAgainUnlessTheGateWasShut) {
     Gate gate;
     ASSERT_TRUE(gate.arrive());
     ASSERT_TRUE(gate.enter());
     gate.leave();
-    EXPECT_TRUE(gate.resume());
+    const std::size_t round = gate.round();
+    EXPECT_TRUE(gate.resume(round));
     gate.leave();
     gate.depart();
-    EXPECT_FALSE(gate.isShut());
     EXPECT_TRUE(gate.close(longEnough));
-    EXPECT_TRUE(gate.isShut());
-    EXPECT_FALSE(gate.resume());
+    EXPECT_FALSE(gate.resume(round));
     EXPECT_TRUE(gate.open());
+    EXPECT_NE(gate.round(), round);
+    EXPECT_FALSE(gate.resume(round)) << "it belongs to a manager that ended";
     EXPECT_TRUE(gate.enter()) << "who was sent away has no turn";
     gate.leave();
 }
@@ -315,7 +316,7 @@ TEST(TurnTest, WhoWaitsToResumeIsSentAwayByTheEndAndWhoComesBackIsNot) {
         diary.note(name + (again() ? " back" : " away"));
         gate.depart();
     };
-    threads.emplace_back(request, "first", [&] { return gate.resume(); });
+    threads.emplace_back(request, "first", [&] { return gate.resume(0); });
     threads.emplace_back(request, "second", [&] {
         gate.comeBack();
         gate.leave();
