@@ -5,7 +5,8 @@ target_compile_options(law_options INTERFACE
 
 set(LAW_SANITIZE "" CACHE STRING "Sanitizers to build with, such as \"address,undefined\" or \"thread\"")
 if(LAW_SANITIZE)
-    set(sanitizers -fsanitize=${LAW_SANITIZE} -fno-sanitize-recover=all -fno-omit-frame-pointer)
+    # Their reports need lines; more debug information would take longer to build.
+    set(sanitizers -fsanitize=${LAW_SANITIZE} -fno-sanitize-recover=all -fno-omit-frame-pointer -g1)
     add_compile_options(${sanitizers})
     add_link_options(${sanitizers})
 endif()

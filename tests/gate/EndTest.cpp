@@ -4,6 +4,7 @@
 #include <cstdlib>
 #include <functional>
 #include <mutex>
+#include <optional>
 #include <thread>
 
 #include "broker/RequestScope.h"
@@ -103,18 +104,16 @@ protected:
         });
         waiting.awaitArrival();
         EXPECT_THAT(gate().cleanupInstanceMI(true), isDone());
-        testsupport::RecordingBroker other;
+        std::optional<testsupport::RecordingBroker> next;  // which then records for both
         if (isOpenedAgain) {
-            EXPECT_NE(gate().createInstanceMI(other.handle(), nullptr), nullptr);
+            EXPECT_NE(gate().createInstanceMI(next.emplace().handle(), nullptr), nullptr);
             EXPECT_THAT(identifiers(), ElementsAre(firstPlace)) << "the next manager is served";
         }
-        broker.forget();
-        other.forget();
+        testsupport::RecordingBroker& latest = next ? *next : broker;
+        latest.forget();
         waiting.release();
         request.join();
-        EXPECT_THAT(other.functions(), IsEmpty());
-        EXPECT_EQ(broker.count("CMPIEnumerationFT.hasNext"), 0) << "the first call after the up-call";
-        EXPECT_EQ(broker.count("CMPIBrokerEncFT.newString"), 0);
+        EXPECT_THAT(latest.functions(), ElementsAre("CMPIBrokerFT.enumerateInstances")) << "the up-call itself";
         close();
         EXPECT_TRUE(isLoaded(testsupport::underTest(GATE_LIBRARY))) << "a request may still have been in it";
         std::_Exit(testing::Test::HasFailure() ? 1 : 0);
