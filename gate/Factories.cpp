@@ -96,10 +96,13 @@ CMPIStatus serve(const CMPIContext* context, const CMPIResult* result, const CMP
     if (!visit.isLetIn || broker == nullptr) {
         return statusOf(CMPI_RC_ERR_FAILED, closed);
     }
-    return guarded(Provider::manager, [&] { operation(Request{broker, context, result, path, visit.round}); });
+    const Request request{broker, context, result, path, visit.round};
+    // Words for it are only its own manager's to make.
+    const auto itsBroker = [&] { return request.hasManager() ? Provider::manager() : nullptr; };
+    return guarded(itsBroker, [&] { operation(request); });
 }
 
-/** Keeps this library and those that it needs in the process: a request that stays at the gate is in them. */
+/** Keeps this library and those that it needs in the process: a request that outlasts the end is in them. */
 void stayLoaded() {
     Dl_info self{};
     if (dladdr(&theGate, &self) != 0) {

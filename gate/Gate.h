@@ -17,11 +17,12 @@ namespace gate {
  * Lets one thread at a time to the provider, in order of arrival.
  *
  * A request arrives, takes turns, and departs. In between it may take several turns, and lets others in while it waits
- * for the object manager (Pause). The lock is no thread's own: during a pause the same thread may come again with
+ * for the object manager. The lock is no thread's own: during such an interruption the same thread may come again with
  * another request.
  *
- * A gate that closes lets nobody in any more; who has a turn, waits for one or comes back from a pause is served. Once
- * it is shut, nobody is inside, and who comes back from a pause waits for it to be opened again.
+ * A gate that closes lets nobody in any more; who has a turn, waits for one or comes back from an interruption is
+ * served. Once it is shut, nobody is inside, and who comes back is sent away, or waits for it to be opened again
+ * (Pause).
  *
  * It needs no destruction: a late request finds it as it was left.
  */
@@ -103,13 +104,6 @@ private:
 
 /** The gate of this library: there is one provider behind it. */
 extern Gate theGate;
-
-/** Ended when the gate has been shut since that round: for who is about to call its manager without a turn. */
-inline void requireManagerOf(std::size_t round) {
-    if (theGate.round() != round) {
-        throw Ended{};
-    }
-}
 
 /** Keeps the thread from being cancelled while it lives: that would end the process, or cut a file in two. */
 class Uncancelled {

@@ -107,6 +107,7 @@ const CMPIBroker* Provider::manager() {
 }
 
 Provider::Provider(const Request& request) : context(request.context) {
+    request.requireManager();
     request.broker = manager();
     if (request.broker == nullptr) {
         fail(CMPI_RC_ERR_FAILED, closedText);

@@ -21,8 +21,15 @@ struct Request {
     const CMPIObjectPath* path;
     std::size_t round;  ///< of the gate, in which it came
 
-    /** Ended when the object manager has ended since: for who has no turn. */
-    void requireManager() const { requireManagerOf(round); }
+    /** Whether its object manager has not ended since. */
+    bool hasManager() const { return theGate.round() == round; }
+
+    /** Ended when it has: for who is about to call it. */
+    void requireManager() const {
+        if (!hasManager()) {
+            throw Ended{};
+        }
+    }
 
     /** The path's class; CMPI_RC_ERR_INVALID_CLASS when it is none that the provider serves. */
     const Class& requestedClass() const;

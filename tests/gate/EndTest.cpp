@@ -92,6 +92,23 @@ protected:
         }
     }
 
+    /** Ends the manager while a request waits in the broker, which then goes on. */
+    void endDuring(
+        WaitingBroker& waiting, const std::function<void()>& ask, const std::function<void()>& meanwhile = [] {}) {
+        std::thread request(ask);
+        waiting.awaitArrival();
+        std::thread end([&] {
+            EXPECT_THAT(gate().cleanupInstanceMI(true), isDone());
+            broker.forget();
+        });
+        awaitRefusal();
+        meanwhile();
+        waiting.release();
+        end.join();
+        request.join();
+        EXPECT_THAT(broker.functions(), IsEmpty()) << "after the end";
+    }
+
     /** Ends the process: with 0 if all goes as it should. */
     [[noreturn]] void outlastTheEnd(bool isOpenedAgain) {
         create(firstPlace);
@@ -168,17 +185,7 @@ TEST_F(EndTest, TheManagersEndWaitsForRequestsAndNoneCallsItsBrokerAfterIt) {
     create("L1");
     WaitingBroker waiting(*broker.handle());
     gate().createInstanceMI(waiting.handle(), nullptr);
-    std::thread request([&] { EXPECT_THAT(gate().enumerateInstances(classPath(lease)), isAnswered(1)); });
-    waiting.awaitArrival();
-    std::thread end([&] {
-        EXPECT_THAT(gate().cleanupInstanceMI(true), isDone());
-        broker.forget();
-    });
-    awaitRefusal();
-    waiting.release();
-    end.join();
-    request.join();
-    EXPECT_THAT(broker.functions(), IsEmpty());
+    endDuring(waiting, [&] { EXPECT_THAT(gate().enumerateInstances(classPath(lease)), isAnswered(1)); });
     unload();  // before the other broker goes
 }
 
@@ -187,17 +194,7 @@ TEST_F(EndTest, ARequestInAnUpCallIsServedWhenTheManagerEnds) {
     WaitingBroker waiting(*broker.handle());
     gate().createInstanceMI(waiting.handle(), nullptr);
     gate().createAssociationMI(waiting.handle(), nullptr);
-    std::thread request([&] { EXPECT_THAT(gate().associatorNames(keyedPath(lease, firstPlace), {}), isAnswered(1)); });
-    waiting.awaitArrival();
-    std::thread end([&] {
-        EXPECT_THAT(gate().cleanupInstanceMI(true), isDone());
-        broker.forget();
-    });
-    awaitRefusal();
-    waiting.release();
-    end.join();
-    request.join();
-    EXPECT_THAT(broker.functions(), IsEmpty()) << "after the end";
+    endDuring(waiting, [&] { EXPECT_THAT(gate().associatorNames(keyedPath(lease, firstPlace), {}), isAnswered(1)); });
     unload();
 }
 
@@ -216,17 +213,13 @@ TEST_F(EndTest, AFactoryWhileTheManagerEndsGivesNothingAndSaysWhy) {
     create(firstPlace);
     WaitingBroker waiting(*broker.handle());
     gate().createInstanceMI(waiting.handle(), nullptr);
-    std::thread request([&] { EXPECT_THAT(gate().enumerateInstances(classPath(lease)), isAnswered(1)); });
-    waiting.awaitArrival();
-    std::thread end([&] { EXPECT_THAT(gate().cleanupInstanceMI(true), isDone()); });
-    awaitRefusal();
-    CMPIStatus status{CMPI_RC_OK, nullptr};
-    EXPECT_EQ(gate().createInstanceMI(waiting.handle(), &status), nullptr);
-    EXPECT_EQ(status.rc, CMPI_RC_ERR_FAILED);
-    EXPECT_THAT(cimhost::statusFrom(status).message, testing::HasSubstr("shutting down"));
-    waiting.release();
-    end.join();
-    request.join();
+    const auto enumerate = [&] { EXPECT_THAT(gate().enumerateInstances(classPath(lease)), isAnswered(1)); };
+    endDuring(waiting, enumerate, [&] {
+        CMPIStatus status{CMPI_RC_OK, nullptr};
+        EXPECT_EQ(gate().createInstanceMI(waiting.handle(), &status), nullptr);
+        EXPECT_EQ(status.rc, CMPI_RC_ERR_FAILED);
+        EXPECT_THAT(cimhost::statusFrom(status).message, testing::HasSubstr("shutting down"));
+    });
     EXPECT_NE(gate().createInstanceMI(broker.handle(), nullptr), nullptr) << "the manager goes on";
     EXPECT_THAT(identifiers(), ElementsAre(firstPlace));
     unload();
