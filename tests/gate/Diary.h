@@ -1,0 +1,59 @@
+#pragma once
+
+#include "Gate.h"
+
+#include <algorithm>
+#include <chrono>
+#include <condition_variable>
+#include <cstddef>
+#include <mutex>
+#include <string>
+#include <thread>
+#include <vector>
+
+// What tests of the gate's lock wait for.
+
+namespace gatetest {
+
+/** Events in the order in which they happen, and a way to wait for one. */
+class Diary {
+public:
+    void note(const std::string& event) {
+        const std::lock_guard<std::mutex> lock(mutex);
+        events.push_back(event);
+        changed.notify_all();
+    }
+
+    void await(const std::string& event) {
+        std::unique_lock<std::mutex> lock(mutex);
+        changed.wait(lock, [&] { return std::find(events.begin(), events.end(), event) != events.end(); });
+    }
+
+    std::vector<std::string> all() {
+        const std::lock_guard<std::mutex> lock(mutex);
+        return events;
+    }
+
+private:
+    std::mutex mutex;
+    std::condition_variable changed;
+    std::vector<std::string> events;
+};
+
+/** For those who close a gate and are not to wait in vain: it ends no test that goes well. */
+constexpr std::chrono::hours longEnough{1};
+
+/** Goes on when so many wait at the gate. */
+inline void awaitQueue(const gate::Gate& gate, std::size_t length) {
+    while (gate.waiting() < length) {
+        std::this_thread::yield();
+    }
+}
+
+inline void join(std::vector<std::thread>& threads) {
+    for (std::thread& thread : threads) {
+        thread.join();
+    }
+}
+
+}  // namespace gatetest
