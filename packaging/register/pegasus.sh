@@ -82,6 +82,7 @@ pegasus_put_back() { # FORMER
     left=$(pegasus_modules) || return
     printf '%s\n' "$1" | while read -r module name; do
         if ! printf '%s\n' "$left" | grep -qx "$module"; then
+            [ "$name" != "$former_computers" ] || name=$computers
             complain "OpenPegasus: trying to register $name again"
             pegasus_load_provider "$name"
         fi

@@ -43,6 +43,15 @@ sfcb_registrations() {
     for file in "$data"/*.reg "$data"/*/*.reg; do
         [ "$others ${file##*/}" = "yes $computers.reg" ] || echo "${file##*/}"
     done
+    sfcb_former_registration
+}
+
+# That of our computers by their former name, if it is staged. Somebody else's may bear that name too.
+sfcb_former_registration() {
+    file=$sfcb_place/stage/regs/$former_computers.reg
+    if grep -qs '^ *group: LeaseAndWarranty$' "$file"; then
+        echo "${file##*/}"
+    fi
 }
 
 sfcb_unstage_all() {
@@ -182,10 +191,18 @@ sfcb_find_other_computers() {
     others=no
     has_computers && return
     for class in $(classes_of "$computers"); do
-        if cat "$sfcb_place"/stage/regs/*.reg 2>/dev/null | sfcb_stanzas | grep "^$class " | grep -qv " $computers\$"; then
+        if sfcb_staged_stanzas | grep "^$class " | grep -qv " $computers\$"; then
             others=yes
         fi
     done
+}
+
+# Class and provider of what anybody has staged, but ourselves under a former name.
+sfcb_staged_stanzas() {
+    former_registration=$(sfcb_former_registration)
+    for file in "$sfcb_place"/stage/regs/*.reg; do
+        [ "${file##*/}" = "$former_registration" ] || cat "$file" 2>/dev/null
+    done | sfcb_stanzas
 }
 
 register_sfcb() {

@@ -30,7 +30,7 @@ class Manager:
     def __init__(self, build, environment):
         data = build / "share" / "lease-warranty-provider"
         self.command = [str(build / "bin" / "cimhost"), "--as", "sfcb", "--format", "json", "--registration",
-                        str(data / "gate"), "--registration", str(data / "ComputerSystemProvider.reg")]
+                        str(data / "gate"), "--registration", str(data / "OstrelComputerSystemProvider.reg")]
         self.environment = environment
         self.asked = []  # the operations, in their order
 

@@ -119,8 +119,8 @@ INSTANTIATE_TEST_SUITE_P(
     AllProviders, ShippedRegistration,
     testing::Values(Shipped{"LeaseAndWarrantyProvider", "LeaseAndWarrantyProvider.reg", "LeaseAndWarranty", served},
                     Shipped{"LeaseAndWarrantyGate", "gate/LeaseAndWarrantyGate.reg", "LeaseAndWarranty", served},
-                    Shipped{"ComputerSystemProvider",
-                            "ComputerSystemProvider.reg",
+                    Shipped{"OstrelComputerSystemProvider",
+                            "OstrelComputerSystemProvider.reg",
                             "OstrelComputerSystem",
                             {"VELKO_ComputerSystem"}}),
     [](const auto& tested) { return std::string(tested.param.provider); });

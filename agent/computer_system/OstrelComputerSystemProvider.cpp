@@ -148,7 +148,7 @@ CMPIStatus execQuery(CMPIInstanceMI* /*mi*/, const CMPIContext* /*context*/, con
 CMPIInstanceMIFT functions = {
     CMPIVersion200,
     CMPIVersion200,
-    "instanceComputerSystemProvider",
+    "instanceOstrelComputerSystemProvider",
     cleanup,
     enumerateInstanceNames,
     enumerateInstances,
@@ -165,9 +165,9 @@ CMPIInstanceMI instanceMI = {nullptr, &functions};
 
 }  // namespace KO::ComputerSystem
 
-extern "C" KO_EXPORT CMPIInstanceMI* ComputerSystemProvider_Create_InstanceMI(const CMPIBroker* broker,
-                                                                              const CMPIContext* /*context*/,
-                                                                              CMPIStatus* status) {
+extern "C" KO_EXPORT CMPIInstanceMI* OstrelComputerSystemProvider_Create_InstanceMI(const CMPIBroker* broker,
+                                                                                    const CMPIContext* /*context*/,
+                                                                                    CMPIStatus* status) {
     KO::ComputerSystem::theBroker = broker;
     if (status != nullptr) {
         *status = {CMPI_RC_OK, nullptr};

@@ -6,7 +6,8 @@
 
 #include <thread>
 
-extern "C" CMPIInstanceMI* ComputerSystemProvider_Create_InstanceMI(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
+extern "C" CMPIInstanceMI* OstrelComputerSystemProvider_Create_InstanceMI(const CMPIBroker*, const CMPIContext*,
+                                                                          CMPIStatus*);
 
 using agent_test::text;
 using agent_test::textIn;
@@ -38,7 +39,7 @@ std::string nameIn(const ObjectPath& path) {
 }
 
 /** Requests to the provider, in a namespace of their own. */
-class ComputerSystemProviderTest : public testing::Test {
+class OstrelComputerSystemProviderTest : public testing::Test {
 protected:
     CMPIObjectPath* path(std::vector<NamedValue> keys = {}, const std::string& className = "VELKO_ComputerSystem") {
         return scope.objectPath({"", "root/other", className, std::move(keys)});
@@ -63,21 +64,21 @@ protected:
     cimhost::ResultEvents events;
     CMPIResult* result = scope.result(events);
     CMPIContext* context = scope.context({});
-    CMPIInstanceMI* mi = ComputerSystemProvider_Create_InstanceMI(host.handle(), context, nullptr);
+    CMPIInstanceMI* mi = OstrelComputerSystemProvider_Create_InstanceMI(host.handle(), context, nullptr);
 };
 
 }  // namespace
 
-TEST_F(ComputerSystemProviderTest, HandsOutItsInterface) {
+TEST_F(OstrelComputerSystemProviderTest, HandsOutItsInterface) {
     CMPIStatus status{CMPI_RC_ERR_FAILED, nullptr};
-    const CMPIInstanceMI* interface = ComputerSystemProvider_Create_InstanceMI(host.handle(), context, &status);
+    const CMPIInstanceMI* interface = OstrelComputerSystemProvider_Create_InstanceMI(host.handle(), context, &status);
     ASSERT_NE(interface, nullptr);
     EXPECT_EQ(status.rc, CMPI_RC_OK);
     EXPECT_EQ(interface->ft->ftVersion, CMPIVersion200);
-    EXPECT_STREQ(interface->ft->miName, "instanceComputerSystemProvider");
+    EXPECT_STREQ(interface->ft->miName, "instanceOstrelComputerSystemProvider");
 }
 
-TEST_F(ComputerSystemProviderTest, NamesEveryComputerThatHasAName) {
+TEST_F(OstrelComputerSystemProviderTest, NamesEveryComputerThatHasAName) {
     EXPECT_TRUE(enumerateNames(path()).ok());
     std::vector<std::string> names;
     for (const ObjectPath& each : cimhost::eventsOf<ObjectPath>(events)) {
@@ -87,7 +88,7 @@ TEST_F(ComputerSystemProviderTest, NamesEveryComputerThatHasAName) {
     EXPECT_EQ(cimhost::doneCount(events), 1);
 }
 
-TEST_F(ComputerSystemProviderTest, GivesEveryPropertyThatTheComputerHas) {
+TEST_F(OstrelComputerSystemProviderTest, GivesEveryPropertyThatTheComputerHas) {
     EXPECT_TRUE(enumerate().ok());
     ASSERT_EQ(instances().size(), 2U);
     EXPECT_EQ(nameIn(instances()[0].path), "host1");
@@ -101,14 +102,14 @@ TEST_F(ComputerSystemProviderTest, GivesEveryPropertyThatTheComputerHas) {
     EXPECT_EQ(cimhost::doneCount(events), 1);
 }
 
-TEST_F(ComputerSystemProviderTest, GetsOneComputerByItsName) {
+TEST_F(OstrelComputerSystemProviderTest, GetsOneComputerByItsName) {
     EXPECT_TRUE(get(path({{"name", text("host2")}}, "velko_computersystem")).ok());
     ASSERT_EQ(instances().size(), 1U);
     EXPECT_EQ(nameIn(instances()[0].path), "host2");
     EXPECT_EQ(cimhost::doneCount(events), 1);
 }
 
-TEST_F(ComputerSystemProviderTest, FindsNoComputerOfAnotherName) {
+TEST_F(OstrelComputerSystemProviderTest, FindsNoComputerOfAnotherName) {
     for (const char* name : {"host3", "HOST1", ""}) {
         const cimhost::Status status = get(path({{"Name", text(name)}}));
         EXPECT_EQ(status.rc, CMPI_RC_ERR_NOT_FOUND) << name;
@@ -117,14 +118,14 @@ TEST_F(ComputerSystemProviderTest, FindsNoComputerOfAnotherName) {
     EXPECT_THAT(events, IsEmpty());
 }
 
-TEST_F(ComputerSystemProviderTest, WantsTheKeyToGetAComputer) {
+TEST_F(OstrelComputerSystemProviderTest, WantsTheKeyToGetAComputer) {
     const cimhost::Status status = get(path({{"InstanceID", text("host1")}}));
     EXPECT_EQ(status.rc, CMPI_RC_ERR_INVALID_PARAMETER);
     EXPECT_EQ(status.message, "The key Name is missing or is not a string");
     EXPECT_EQ(get(path({{"Name", agent_test::nullOf(CMPI_string)}})).rc, CMPI_RC_ERR_INVALID_PARAMETER);
 }
 
-TEST_F(ComputerSystemProviderTest, GivesThePropertiesOfTheListAndTheKey) {
+TEST_F(OstrelComputerSystemProviderTest, GivesThePropertiesOfTheListAndTheKey) {
     const char* list[] = {"vendor", "NoSuchProperty", "MODEL", nullptr};
     EXPECT_TRUE(get(path({{"Name", text("host1")}}), list).ok());
     EXPECT_TRUE(enumerate(list).ok());
@@ -138,7 +139,7 @@ TEST_F(ComputerSystemProviderTest, GivesThePropertiesOfTheListAndTheKey) {
     EXPECT_THAT(propertiesOf(instances().back()), ElementsAre(Pair("Name", "host1")));
 }
 
-TEST_F(ComputerSystemProviderTest, ServesNoOtherClass) {
+TEST_F(OstrelComputerSystemProviderTest, ServesNoOtherClass) {
     const cimhost::Status status = enumerateNames(path({}, "VELKO_Lease"));
     EXPECT_EQ(status.rc, CMPI_RC_ERR_INVALID_CLASS);
     EXPECT_EQ(status.message, "This provider serves VELKO_ComputerSystem only");
@@ -147,7 +148,7 @@ TEST_F(ComputerSystemProviderTest, ServesNoOtherClass) {
     EXPECT_THAT(events, IsEmpty());
 }
 
-TEST_F(ComputerSystemProviderTest, IsReadOnlyAndAnswersNoQueries) {
+TEST_F(OstrelComputerSystemProviderTest, IsReadOnlyAndAnswersNoQueries) {
     const CMPIInstanceMIFT& functions = *mi->ft;
     CMPIObjectPath* object = path({{"Name", text("host1")}});
     CMPIInstance* instance = scope.instance({});
@@ -158,14 +159,14 @@ TEST_F(ComputerSystemProviderTest, IsReadOnlyAndAnswersNoQueries) {
     EXPECT_THAT(events, IsEmpty());
 }
 
-TEST_F(ComputerSystemProviderTest, GoesOnAfterCleanup) {
+TEST_F(OstrelComputerSystemProviderTest, GoesOnAfterCleanup) {
     EXPECT_EQ(mi->ft->cleanup(mi, context, 1).rc, CMPI_RC_OK);
     EXPECT_EQ(mi->ft->cleanup(mi, context, 0).rc, CMPI_RC_OK);
     EXPECT_TRUE(enumerate().ok());
     EXPECT_EQ(instances().size(), 2U);
 }
 
-TEST_F(ComputerSystemProviderTest, SaysThatTheBrokerCouldNotMakeAnObject) {
+TEST_F(OstrelComputerSystemProviderTest, SaysThatTheBrokerCouldNotMakeAnObject) {
     cimhost::FunctionTables tables = cimhost::standardTables();
     tables.encapsulation.newInstance = [](const CMPIBroker*, const CMPIObjectPath*,
                                           CMPIStatus* status) -> CMPIInstance* {
@@ -175,13 +176,13 @@ TEST_F(ComputerSystemProviderTest, SaysThatTheBrokerCouldNotMakeAnObject) {
     cimhost::BrokerOptions options;
     options.tables = &tables;
     const cimhost::Broker failing(options);
-    mi = ComputerSystemProvider_Create_InstanceMI(failing.handle(), context, nullptr);
+    mi = OstrelComputerSystemProvider_Create_InstanceMI(failing.handle(), context, nullptr);
     EXPECT_EQ(enumerate().rc, CMPI_RC_ERR_FAILED);
     EXPECT_EQ(get(path({{"Name", text("host1")}})).rc, CMPI_RC_ERR_FAILED);
     EXPECT_THAT(events, IsEmpty());
 }
 
-TEST_F(ComputerSystemProviderTest, AnswersOnManyThreadsAtATime) {
+TEST_F(OstrelComputerSystemProviderTest, AnswersOnManyThreadsAtATime) {
     std::vector<std::thread> threads;
     std::vector<std::size_t> counts(4);
     for (std::size_t& count : counts) {
