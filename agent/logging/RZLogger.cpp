@@ -2,6 +2,8 @@
 
 #include "logging/Writer.h"
 
+#include <pthread.h>
+
 #include <cerrno>
 
 namespace RZLog {
@@ -12,20 +14,30 @@ std::string_view orEmpty(const char* text) {
     return text != nullptr ? text : "";
 }
 
-/** Whoever logs an error of the system still wants to look at errno afterwards. */
-class ErrnoKeeper {
+/**
+ * Whoever logs an error of the system still wants to look at errno afterwards. And a thread that is cancelled goes on
+ * until the record is written: the system unwinds it by what looks like an exception, and no catch may keep that.
+ */
+class Undisturbed {
 public:
-    ErrnoKeeper() : kept(errno) {}
-    ~ErrnoKeeper() { errno = kept; }
-    ErrnoKeeper(const ErrnoKeeper&) = delete;
-    ErrnoKeeper& operator=(const ErrnoKeeper&) = delete;
+    Undisturbed() : error(errno) { ::pthread_setcancelstate(PTHREAD_CANCEL_DISABLE, &cancelling); }
+    ~Undisturbed() {
+        ::pthread_setcancelstate(cancelling, nullptr);
+        errno = error;
+    }
+    Undisturbed(const Undisturbed&) = delete;
+    Undisturbed& operator=(const Undisturbed&) = delete;
 
 private:
-    int kept;
+    int error;
+    int cancelling = PTHREAD_CANCEL_ENABLE;
 };
 
 void writeIfAdmitted(const Record& record) noexcept {
-    const ErrnoKeeper keeper;
+    if (record.level > highestLevel()) {
+        return;
+    }
+    const Undisturbed undisturbed;
     try {
         if (record.level <= levelsOf(record.logger).of(record.channel)) {
             write(record);
@@ -50,7 +62,7 @@ bool RZLogger::admits(const std::string& logger, int level) noexcept {
     if (level > highestLevel()) {  // nearly always: most records are asked about, and never written
         return false;
     }
-    const ErrnoKeeper keeper;
+    const Undisturbed undisturbed;
     try {
         return level <= levelsOf(logger).highest();
     } catch (...) {

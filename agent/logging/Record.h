@@ -8,6 +8,9 @@
 
 namespace RZLog {
 
+/** The logger of the agent's own libraries. */
+constexpr const char* ownLogger = "Ostrel.Agent";
+
 /** One record on its way to the log. The texts are borrowed. */
 struct Record {
     Channel channel = Channel::log;

@@ -1,9 +1,12 @@
 #include "logging/Sinks.h"
 
+#include "logging/SystemLogs.h"
+
 #include <fcntl.h>
 #include <sys/stat.h>
-#include <syslog.h>
 #include <unistd.h>
+
+#include <system_error>
 
 #pragma GCC diagnostic push
 #pragma GCC diagnostic ignored "-Wconversion"
@@ -11,19 +14,13 @@
 #pragma GCC diagnostic ignored "-Wpedantic"
 #include <spdlog/pattern_formatter.h>
 #include <spdlog/sinks/rotating_file_sink.h>
-#include <spdlog/sinks/systemd_sink.h>
 #pragma GCC diagnostic pop
 
 namespace RZLog {
 
 namespace {
 
-constexpr int errorLevel = 3000;
 constexpr mode_t fileMode = 0640;
-
-bool isError(const Record& record) {
-    return record.level <= errorLevel;
-}
 
 /**
  * Makes sure that a log file is there, with a mode that keeps clients' data from everybody, and that
@@ -57,32 +54,16 @@ public:
 private:
     static spdlog::file_event_handlers handlers() {
         spdlog::file_event_handlers events;
-        events.before_open = [](const std::string& path) { prepareFile(path); };
+        // Else the file would be opened all the same: made for everybody to read, with its directory; or a pipe.
+        events.before_open = [](const std::string& path) {
+            if (!prepareFile(path)) {
+                throw std::system_error(std::make_error_code(std::errc::io_error));
+            }
+        };
         return events;
     }
 
     spdlog::sinks::rotating_file_sink_st file;
-};
-
-/** Without openlog and closelog: identity and options of the system log are the host process's. */
-class SyslogSink : public Sink {
-public:
-    void write(const Record& record) override {
-        const std::string line = systemLogLine(record);
-        ::syslog(LOG_DAEMON | (isError(record) ? LOG_ERR : LOG_DEBUG), "%s", line.c_str());
-    }
-};
-
-class JournalSink : public Sink {
-public:
-    void write(const Record& record) override {
-        const std::string line = systemLogLine(record);
-        journal.log(spdlog::details::log_msg("ostrel-agent",
-                                             isError(record) ? spdlog::level::err : spdlog::level::debug, line));
-    }
-
-private:
-    spdlog::sinks::systemd_sink_st journal;
 };
 
 }  // namespace
@@ -90,11 +71,11 @@ private:
 std::unique_ptr<Sink> openSink(const LogSettings& settings) {
     switch (settings.destination) {
         case LogSettings::Destination::file:
-            return prepareFile(settings.file) ? std::make_unique<FileSink>(settings) : nullptr;
+            return std::make_unique<FileSink>(settings);
         case LogSettings::Destination::syslog:
-            return std::make_unique<SyslogSink>();
+            return openSystemLog(settings);
         case LogSettings::Destination::journal:
-            return std::make_unique<JournalSink>();
+            return openJournal(settings);
         case LogSettings::Destination::none:
             break;
     }

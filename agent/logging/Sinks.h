@@ -21,7 +21,8 @@ public:
 
 /**
  * Opens the destination of the settings.
- * @return null when there is none or it cannot be opened
+ * @return null when there is none
+ * @throws std::exception when it cannot be opened
  */
 std::unique_ptr<Sink> openSink(const LogSettings& settings);
 

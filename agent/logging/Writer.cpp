@@ -57,12 +57,11 @@ void writeUnlessFailing(const Record& record) noexcept {
 }
 
 void reportProblems(const Agent::Problems& problems, const Levels& levels) {
-    const std::string logger = "Ostrel.Agent";
     constexpr int level = 3000;
     for (const std::string& problem : problems) {
         for (const Channel channel : {Channel::log, Channel::trace}) {
-            if (levels.admit(channel, logger, level)) {
-                write({channel, level, logger, "configure", "Writer.cpp", __LINE__, problem});
+            if (levels.admit(channel, ownLogger, level)) {
+                write({channel, level, ownLogger, "configure", "Writer.cpp", __LINE__, problem});
             }
         }
     }

@@ -7,6 +7,7 @@
 #include "KO/Strings.h"
 #include "RZLog/RZLogger.h"
 
+#include <pthread.h>
 #include <sys/resource.h>
 
 #include <cerrno>
@@ -86,6 +87,17 @@ void logToAFullDisk() {
     ::setrlimit(RLIMIT_FSIZE, &limit);
 }
 
+/** probe cancelled: a thread that has been cancelled logs, as the first thing that it does. */
+void logCancelled() {
+    std::thread thread([] {
+        ::pthread_cancel(::pthread_self());
+        log(3000, "Ostrel.Test", "cancelled");
+        ::pthread_testcancel();
+        std::cout << "not cancelled" << std::endl;
+    });
+    thread.join();
+}
+
 /** Logs when the process's static objects go, those of the libraries included. */
 struct LogAtExit {
     bool enabled = false;
@@ -111,6 +123,8 @@ int main(int count, char** arguments) {
         show();
     } else if (words.size() == 1 && words[0] == "limited") {
         logToAFullDisk();
+    } else if (words.size() == 1 && words[0] == "cancelled") {
+        logCancelled();
     } else if (words.size() == 1 && words[0] == "crash") {
         log(3000, "Ostrel.Test", "the last words");
         std::_Exit(0);

@@ -135,6 +135,13 @@ TEST_F(LogInProcess, LosesNothingWhenTheProcessEndsAbruptly) {
     EXPECT_THAT(lines()[0], HasSubstr("the last words"));
 }
 
+/** It is unwound by an exception that nobody may keep: else the C library ends the process. */
+TEST_F(LogInProcess, LetsAThreadThatIsCancelledEndAfterItsRecord) {
+    run(toFile(), {"cancelled"});
+    ASSERT_THAT(lines(), SizeIs(2));
+    EXPECT_THAT(lines()[1], HasSubstr("\ttrace\t3000\tOstrel.Test\t"));
+}
+
 TEST_F(LogInProcess, TakesRecordsFromManyThreads) {
     run(toFile(), {"many", "4", "200"});
     std::vector<std::string> all = lines();

@@ -1,0 +1,124 @@
+#include "logging/SystemLogs.h"
+
+#include <sys/socket.h>
+#include <sys/un.h>
+#include <syslog.h>
+#include <unistd.h>
+
+#include <cerrno>
+#include <cstdio>
+#include <ctime>
+#include <system_error>
+
+namespace RZLog {
+
+namespace {
+
+constexpr int errorLevel = 3000;
+
+/** A socket that sends datagrams to a path and never waits. */
+class Datagrams {
+public:
+    explicit Datagrams(const std::string& path)
+        : descriptor(::socket(AF_UNIX, SOCK_DGRAM | SOCK_NONBLOCK | SOCK_CLOEXEC, 0)) {
+        if (descriptor < 0) {
+            throw std::system_error(errno, std::generic_category());
+        }
+        address.sun_family = AF_UNIX;
+        path.copy(address.sun_path, sizeof address.sun_path - 1);
+    }
+    ~Datagrams() { ::close(descriptor); }
+    Datagrams(const Datagrams&) = delete;
+    Datagrams& operator=(const Datagrams&) = delete;
+
+    /** Not connected: so a service that was started anew is found. @return whether it was taken */
+    bool send(const std::string& content) const {
+        return ::sendto(descriptor, content.data(), content.size(), MSG_NOSIGNAL | MSG_DONTWAIT,
+                        reinterpret_cast<const sockaddr*>(&address), sizeof address) >= 0;
+    }
+
+private:
+    int descriptor;
+    sockaddr_un address{};
+};
+
+std::string cut(std::string text) {
+    if (text.size() > longestText) {
+        std::size_t end = longestText;
+        while (end > 0 && (static_cast<unsigned char>(text[end]) & 0xC0U) == 0x80U) {  // in a character of UTF-8
+            --end;
+        }
+        text.resize(end);
+    }
+    return text;
+}
+
+/** A message to the service about one line, of LOG_ERR or LOG_DEBUG. */
+using Form = std::string (*)(int priority, const std::string& line);
+
+class DatagramSink : public Sink {
+public:
+    DatagramSink(const std::string& socketPath, Form itsForm, bool itTells)
+        : datagrams(socketPath), form(itsForm), tells(itTells) {}
+
+    void write(const Record& record) override {
+        if (!(tellOfDropped() && send(record))) {
+            ++dropped;
+        }
+    }
+
+private:
+    bool send(const Record& record) {
+        return datagrams.send(form(record.level <= errorLevel ? LOG_ERR : LOG_DEBUG, cut(systemLogLine(record))));
+    }
+
+    bool tellOfDropped() {
+        const std::string text = std::to_string(dropped) + " records were lost: the log's service did not take them";
+        if (dropped != 0 && tells &&
+            !send({Channel::log, errorLevel, ownLogger, "write", "SystemLogs.cpp", __LINE__, text})) {
+            return false;
+        }
+        dropped = 0;
+        return true;
+    }
+
+    Datagrams datagrams;
+    Form form;
+    bool tells;
+    unsigned long dropped = 0;
+};
+
+/** As syslog(3) has it where the process did not call openlog(3). */
+std::string systemLogMessage(int priority, const std::string& line) {
+    const std::time_t now = std::time(nullptr);
+    std::tm fields{};
+    ::localtime_r(&now, &fields);
+    static constexpr const char* months[] = {"Jan", "Feb", "Mar", "Apr", "May", "Jun",
+                                             "Jul", "Aug", "Sep", "Oct", "Nov", "Dec"};
+    char time[96];
+    std::snprintf(time, sizeof time, "%s %2d %02d:%02d:%02d", months[fields.tm_mon], fields.tm_mday, fields.tm_hour,
+                  fields.tm_min, fields.tm_sec);
+    return "<" + std::to_string(LOG_DAEMON | priority) + ">" + time + " " + program_invocation_short_name + ": " + line;
+}
+
+/** The journal's own protocol; a line has no line end in it. */
+std::string journalMessage(int priority, const std::string& line) {
+    return "MESSAGE=" + line + "\nPRIORITY=" + std::to_string(priority) + "\nSYSLOG_IDENTIFIER=ostrel-agent\n";
+}
+
+std::unique_ptr<Sink> open(const LogSettings& settings, const std::string& socketPath, Form form) {
+    const bool tells = settings.levels.admit(Channel::log, ownLogger, errorLevel);
+    return std::make_unique<DatagramSink>(socketPath, form, tells);
+}
+
+}  // namespace
+
+std::unique_ptr<Sink> openSystemLog(const LogSettings& settings, const std::string& socketPath) {
+    return open(settings, socketPath, &systemLogMessage);
+}
+
+std::unique_ptr<Sink> openJournal(const LogSettings& settings, const std::string& socketPath) {
+    return open(settings, socketPath, &journalMessage);
+}
+
+}  // namespace RZLog
