@@ -27,11 +27,11 @@ Course undisturbed(Scene& scene, const Request& request);
  */
 void expectPartOfAnswer(const Course& course, const testsupport::Outcome& outcome, bool lacksMemory = false);
 
-/**
- * Each value of each instance is that of before or that of after: what a modification has set when it is left stays.
- * Creations and deletions are done or not.
- */
-void expectOldOrNew(const Course& course, const Lines& now);
+/** Of the values given, the first ones are those of after, and the others those of before. */
+void expectSetInOrder(const Course& course, const Request& request, const Lines& now);
+
+/** Whether a failure of the provider itself keeps a modification from reading asset.dat, and lets it write the file. */
+bool hindersReading(const Fault& fault);
 
 /** Whether a failure may keep a modification from reading asset.dat, and yet let it write the file. */
 bool mayHinderReading(const Fault& fault);

@@ -12,6 +12,26 @@ using testing::AnyOf;
 using testing::ElementsAre;
 using testing::StartsWith;
 
+/**
+ * What a failure may leave that is neither as it was nor as it should be, with the reason (docs/data-files.md). Nothing
+ * else is let pass.
+ */
+enum class Exception {
+    none,
+    modificationHalfWay,  ///< the provider sets the properties one after the other, and takes none back
+    assetNotRead,         ///< the provider goes on where reading asset.dat failed, and writes all of its keys
+};
+
+Exception exceptionFor(const Request& request, const Fault& fault) {
+    if (request.instance.properties.empty()) {
+        return Exception::none;
+    }
+    if (request.changes == std::string(assetFile)) {
+        return hindersReading(fault) ? Exception::assetNotRead : Exception::none;
+    }
+    return isOnFiles(fault.kind) ? Exception::none : Exception::modificationHalfWay;
+}
+
 class RequestFaultTest : public testing::TestWithParam<Request> {
 protected:
     RequestFaultTest() : course(undisturbed(scene, request())) {}
@@ -35,11 +55,7 @@ protected:
                 EXPECT_EQ(files.at(name), content);
             }
         }
-        if (file() == assetFile) {
-            expectAssetFile(course, fault, files.at(file()));
-        } else {
-            expectOldOrNew(course, scene.instancesOf(classOf(file())));
-        }
+        expectNoMoreThanTheException(exceptionFor(request(), fault), fault, files.at(file()));
         if (changes()) {
             expectRepairable(files.at(file()), fault);
         }
@@ -49,6 +65,22 @@ protected:
     const Course course;
 
 private:
+    void expectNoMoreThanTheException(Exception exception, const Fault& fault, const std::string& content) {
+        if (exception == Exception::assetNotRead) {
+            expectAssetFile(course, fault, content);
+            return;
+        }
+        if (file() == assetFile) {
+            EXPECT_THAT(content, AnyOf(course.fileBefore, course.fileAfter));
+        }
+        const Lines now = scene.instancesOf(classOf(file()));
+        if (exception == Exception::modificationHalfWay) {
+            expectSetInOrder(course, request(), now);
+        } else {
+            EXPECT_THAT(now, AnyOf(course.before, course.after));
+        }
+    }
+
     /** The next change stores everything. */
     void expectRepairable(const std::string& content, const Fault& fault) {
         EXPECT_EQ(scene.ask(repairOf(file())).outcome.rc, CMPI_RC_OK);
@@ -74,11 +106,11 @@ private:
     }
 };
 
-TEST_P(RequestFaultTest, IsServedWithoutMemoryAndLeavesAllAsItWasOrAsItShouldBe) {
+TEST_P(RequestFaultTest, IsServedWithoutMemoryAndLeavesWhatItHadSetByThen) {
     eachFault(course.done.counts, memoryFailures(), [&](const Fault& fault) { failOne(fault); });
 }
 
-TEST_P(RequestFaultTest, IsServedWithoutFilesAndLeavesAllAsItWasOrAsItShouldBe) {
+TEST_P(RequestFaultTest, IsServedWithoutFilesAndLeavesAllAsItWasOrAsItShouldBeUnlessItCouldNotReadAssetData) {
     eachFault(course.done.counts, fileFailures(), [&](const Fault& fault) { failOne(fault); });
 }
 

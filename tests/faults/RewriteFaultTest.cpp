@@ -3,6 +3,7 @@
 
 #include <algorithm>
 #include <cerrno>
+#include <set>
 
 #include "Killing.h"
 #include "Scene.h"
@@ -41,6 +42,11 @@ protected:
         restart();
         scene.ask(requestNamed("ModifyLease"));
         return scene.files().at(leaseFile);
+    }
+
+    int allocationsOfRewrite() {
+        restart();
+        return scene.ask(requestNamed("ModifyLease")).counts.at(operationAllocate);
     }
 
     static std::string firstLines(const std::string& text, int count) {
@@ -89,17 +95,38 @@ TEST_F(RewriteFaultTest, WhatIsWrittenInPartsOrInterruptedIsWrittenToItsEnd) {
     }
 }
 
-TEST_F(RewriteFaultTest, LackOfMemoryKeepsTheFileAsItWasOrWritesItWhole) {
+/** The modification ends where the memory is refused, and what it has set by then is kept: in the order of the lines.
+ */
+TEST_F(RewriteFaultTest, MemoryThatIsRefusedOnceKeepsTheFileOrWritesAllOfItWithTheValuesSetByThen) {
     const std::string before = leaseRecords(leases);
     const std::string whole = wholeFile();
-    Counts counts = scene.ask(requestNamed("ModifyLease")).counts;
-    int written = 0;
-    for (int number = 1; number <= counts[operationAllocate]; ++number) {
-        const std::string content = rewriteWith({operationAllocate, number, true});
-        EXPECT_EQ(std::count(content.begin(), content.end(), '\n'), writesOfRewrite);
-        written += content == before ? 0 : 1;
+    const int allocations = allocationsOfRewrite();
+    std::vector<std::string> possible;
+    for (int line = 0; line <= writesOfRewrite; ++line) {
+        possible.push_back(firstLines(whole, line) + before.substr(firstLines(before, line).size()));
     }
-    EXPECT_LT(written, counts[operationAllocate]);
+    std::set<std::string> seen;
+    for (int number = 1; number <= allocations; ++number) {
+        SCOPED_TRACE(number);
+        seen.insert(rewriteWith({operationAllocate, number, false}));
+        ASSERT_THAT(seen, testing::Each(testing::AnyOfArray(possible)));
+    }
+    EXPECT_EQ(seen.count(before), 1U);
+    EXPECT_GT(seen.size(), 2U) << "half-way modifications";
+}
+
+TEST_F(RewriteFaultTest, MemoryThatIsRefusedFromThenOnKeepsTheFile) {
+    const int allocations = allocationsOfRewrite();
+    for (int number = 1; number <= allocations; ++number) {
+        ASSERT_EQ(rewriteWith({operationAllocate, number, true}), leaseRecords(leases)) << number;
+    }
+}
+
+TEST_F(RewriteFaultTest, AClosingThatFailsHasWrittenTheFileWhole) {
+    const std::string whole = wholeFile();
+    for (const bool lasting : {false, true}) {
+        EXPECT_EQ(rewriteWith({operationClose, 1, lasting, EIO}), whole);
+    }
 }
 
 TEST_F(RewriteFaultTest, AfterARestartTheRecordsBeforeTheGapAreThereAndCopiesStandForTheRest) {
