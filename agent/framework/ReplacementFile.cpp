@@ -52,11 +52,7 @@ public:
             }
             return;
         }
-        if (::fchown(file.get(), status.st_uid, status.st_gid) != 0) {
-            // Only the superuser may give a file away; anybody else keeps it as its own.
-        }
-        constexpr mode_t permissions = 07777;
-        if (::fchmod(file.get(), status.st_mode & permissions) != 0) {
+        if (::fchmod(file.get(), adoptOwners(status) ? status.st_mode & 07777 : withoutGroup(status.st_mode)) != 0) {
             fail(target);
         }
     }
@@ -83,6 +79,20 @@ public:
     }
 
 private:
+    /**
+     * Only the superuser may give a file away; anybody else keeps it as its own, but may give it to a group of its own.
+     * @return whether the group is the one of before
+     */
+    bool adoptOwners(const struct stat& status) {
+        constexpr uid_t unchanged = static_cast<uid_t>(-1);
+        return ::fchown(file.get(), status.st_uid, status.st_gid) == 0 ||
+               ::fchown(file.get(), unchanged, status.st_gid) == 0;
+    }
+
+    /** What was the group's is nobody's, and everybody has no more than the group had, whose members now belong there.
+     */
+    static mode_t withoutGroup(mode_t mode) { return (mode & 0700U) | (mode & (mode >> 3U) & 07U); }
+
     std::string path;
     OpenFile file;
 };

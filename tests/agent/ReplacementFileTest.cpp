@@ -5,13 +5,17 @@
 #include "support/Umask.h"
 
 #include <gmock/gmock.h>
+#include <grp.h>
 #include <gtest/gtest.h>
 #include <sys/resource.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
 #include <csignal>
+#include <cstdlib>
 #include <filesystem>
+#include <utility>
+#include <vector>
 
 using agent_test::TemporaryDirectory;
 using KO::replaceFile;
@@ -56,6 +60,56 @@ TEST(ReplacementFile, KeepsTheOwner) {
     EXPECT_EQ(status.st_gid, group);
     EXPECT_EQ(modeOf(path), 0660U);
 }
+
+/** What the file is after somebody without rights, who may write to its directory, has replaced it. */
+struct stat statusAfterReplacement(const TemporaryDirectory& directory, const std::vector<gid_t>& groupsOfReplacer) {
+    constexpr uid_t somebody = 65534;
+    EXPECT_EQ(::chown(directory.path().c_str(), somebody, somebody), 0);
+    const auto replaceAsSomebody = [&] {
+        if (::setgroups(groupsOfReplacer.size(), groupsOfReplacer.data()) != 0 || ::setgid(somebody) != 0 ||
+            ::setuid(somebody) != 0) {
+            std::_Exit(2);
+        }
+        replaceFile(directory.file("file"), "new");
+        std::_Exit(0);
+    };
+    EXPECT_EXIT(replaceAsSomebody(), testing::ExitedWithCode(0), "");
+    EXPECT_EQ(directory.read("file"), "new");
+    struct stat status {};
+    EXPECT_EQ(::stat(directory.file("file").c_str(), &status), 0);
+    return status;
+}
+
+class ReplacementByAnother : public testing::TestWithParam<std::pair<mode_t, mode_t>> {
+protected:
+    void SetUp() override {
+        if (::geteuid() != 0) {
+            GTEST_SKIP() << "only root can make somebody else's file";
+        }
+        const std::string path = directory.write("file", "old");
+        ASSERT_EQ(::chown(path.c_str(), 4711, group), 0);
+        ASSERT_EQ(::chmod(path.c_str(), GetParam().first), 0);
+    }
+
+    static constexpr gid_t group = 4712;
+    const TemporaryDirectory directory;
+};
+
+TEST_P(ReplacementByAnother, GivesTheRightsOfTheGroupToNoOther) {
+    const struct stat status = statusAfterReplacement(directory, {});
+    EXPECT_NE(status.st_gid, group);
+    EXPECT_EQ(status.st_mode & 07777U, GetParam().second);
+}
+
+TEST_P(ReplacementByAnother, KeepsAGroupOfItsOwnWithItsRights) {
+    const struct stat status = statusAfterReplacement(directory, {group});
+    EXPECT_EQ(status.st_gid, group);
+    EXPECT_EQ(status.st_mode & 07777U, GetParam().first);
+}
+
+INSTANTIATE_TEST_SUITE_P(Modes, ReplacementByAnother,
+                         testing::Values(std::pair<mode_t, mode_t>{0640, 0600}, std::pair<mode_t, mode_t>{0664, 0604},
+                                         std::pair<mode_t, mode_t>{0606, 0600}, std::pair<mode_t, mode_t>{0600, 0600}));
 
 TEST(ReplacementFile, IsItsOwnersAloneWhenItIsNew) {
     const testsupport::Umask none(0);
