@@ -5,7 +5,9 @@ find_pegasus() {
     has cimprovider || has cimmof || has cimserver
 }
 
-# OpenPegasus takes registrations back through its server only, and keeps old ones where new ones are given.
+# OpenPegasus takes registrations back through its server only, and keeps old ones where new ones are given. Its cimmofl,
+# which writes into the repository of a stopped server, is not used: what is registered cannot be seen then, so an old
+# registration would stay, and a server that does not answer may yet run, and write there too.
 pegasus_server() {
     for tool in cimmof cimprovider; do
         has "$tool" || {
@@ -21,7 +23,7 @@ pegasus_server() {
 
 # Those of ours that are registered.
 pegasus_modules() {
-    modules=$(cimprovider -l 2>/dev/null </dev/null) || return 1
+    modules=$(limited cimprovider -l 2>/dev/null) || return 1
     for module in $(modules_in "$data"/pegasus/*.mof); do
         if printf '%s\n' "$modules" | grep -qx "$module"; then
             echo "$module"
@@ -32,28 +34,64 @@ pegasus_modules() {
 # Module and provider of what is registered of ours.
 pegasus_registered() {
     for module in $(pegasus_modules); do
-        cimprovider -l -m "$module" </dev/null | sed "s/^/$module /"
+        limited cimprovider -l -m "$module" | sed "s/^/$module /"
     done
 }
 
-pegasus_has_class() {
-    cimcli gc -n "$namespace" "$1" </dev/null >/dev/null 2>&1
+# Its builds keep registrations in namespaces of different names. That is looked for by asking: cimmof would make a
+# namespace that is not there.
+pegasus_find_interop() {
+    places=${interop:-root/PG_InterOp root/interop interop}
+    for interop in $places; do
+        if ! has cimcli || pegasus_has_class "$interop" PG_ProviderModule; then
+            return 0
+        fi
+    done
+    failed "OpenPegasus: no namespace of $places has the class PG_ProviderModule: name the one for --interop"
+    return 1
 }
 
-# Computers may be served by another agent's provider: their class is not ours then.
+pegasus_has_class() { # NAMESPACE CLASS
+    limited cimcli gc -n "$1" "$2" >/dev/null 2>&1
+}
+
+# Computers may be served by another agent's provider: their class is not ours then. What cannot be known is left alone.
 pegasus_find_other_computers() {
-    others=no
-    if ! has_computers && ! pegasus_modules | grep -qx "$(modules_in "$data/pegasus/$computers.mof")" &&
-        has cimcli && pegasus_has_class "$(classes_of "$computers")"; then
-        others=yes
+    others=yes
+    if has_computers || pegasus_modules | grep -qx "$(modules_in "$data/pegasus/$computers.mof")"; then
+        others=no
+    elif has cimcli && served=$(pegasus_served) && ! printf '%s\n' "$served" | grep -qx "$(classes_of "$computers")"; then
+        others=no
     fi
 }
 
+# The classes that anybody's provider is registered for.
+pegasus_served() {
+    pegasus_find_interop >/dev/null 2>&1 || return 1
+    capabilities=$(limited cimcli ei -n "$interop" PG_ProviderCapabilities 2>/dev/null) || return 1
+    printf '%s\n' "$capabilities" | sed -n 's/^[[:space:]]*ClassName = "\(.*\)";.*/\1/p'
+}
+
 pegasus_load_classes() {
+    [ "$with_qualifiers" = no ] || run cimmof -uc -n "$namespace" "$data/qualifiers.mof" || return 1
+    others=no
+    if ! has_computers; then
+        others=yes
+        pegasus_declare_computers
+    fi
     # shellcheck disable=SC2046 # one word a file: installation directories have no blanks
-    set -- $(our_classes | sed "s|.*|$data/&.mof|")
-    [ "$with_qualifiers" = no ] || set -- "$data/qualifiers.mof" "$@"
-    run cimmof -uc -n "$namespace" "$@"
+    run cimmof -uc -n "$namespace" $(our_classes | sed "s|.*|$data/&.mof|")
+}
+
+# Associations refer to computers. A class that another agent may have declared is declared where there is none, and not
+# changed.
+pegasus_declare_computers() {
+    for class in $(classes_of "$computers"); do
+        if has cimcli && pegasus_has_class "$namespace" "$class"; then
+            continue
+        fi
+        run cimmof -n "$namespace" "$data/$class.mof" || complain "OpenPegasus: going on: $class may be declared already"
+    done
 }
 
 pegasus_remove_modules() {
@@ -64,7 +102,7 @@ pegasus_remove_modules() {
 }
 
 pegasus_load_provider() { # LIBRARY
-    run cimmof -n root/PG_InterOp "$data/pegasus/$1.mof"
+    run cimmof -n "$interop" "$data/pegasus/$1.mof"
 }
 
 # A provider's place is taken when the former one is gone. It comes back where that or the new one fails.
@@ -91,21 +129,22 @@ pegasus_put_back() { # FORMER
 
 pegasus_look_for_library() {
     has cimconfig || return 0
-    directories=$(cimconfig -g providerDir 2>/dev/null </dev/null) || return 0
+    directories=$(limited cimconfig -g providerDir 2>/dev/null) || return 0
     case $directories in
     *"$libraries"*) ;;
     *) say "OpenPegasus may not find the library: set providerDir to a list with $libraries (cimconfig -p -s)" ;;
     esac
 }
 
+# A signal is not heeded before the new registration has taken the old one's place.
 register_pegasus() {
-    pegasus_server || return
+    pegasus_server && pegasus_find_interop || return
     before=$(pegasus_registered)
     choose_library "$before" || {
         say "OpenPegasus: nothing was registered, and nothing is renewed"
         return
     }
-    pegasus_find_other_computers
+    on_signal ''
     if pegasus_replace "$before"; then
         registered_with=$registered_with,pegasus
         done_saying "OpenPegasus: registered $library"
@@ -114,6 +153,7 @@ register_pegasus() {
         failed "OpenPegasus: not registered as it should be; now it has:"
         list_pegasus >&2
     fi
+    on_signal -
 }
 
 pegasus_delete_classes() {
@@ -122,7 +162,7 @@ pegasus_delete_classes() {
         return 0
     }
     for class in $(our_classes | tac); do
-        if pegasus_has_class "$class"; then
+        if pegasus_has_class "$namespace" "$class"; then
             run cimcli dc -n "$namespace" "$class" || return 1
         fi
     done
@@ -130,6 +170,7 @@ pegasus_delete_classes() {
 
 unregister_pegasus() {
     pegasus_server || return
+    on_signal ''
     pegasus_find_other_computers
     if pegasus_remove_modules && pegasus_delete_classes; then
         done_saying "OpenPegasus: unregistered"
@@ -137,6 +178,14 @@ unregister_pegasus() {
         failed "OpenPegasus: not unregistered; now it has:"
         list_pegasus >&2
     fi
+    on_signal -
+}
+
+pegasus_registered_classes() {
+    pegasus_modules >/dev/null || return 1
+    pegasus_registered | while read -r module name; do
+        classes_of "$name"
+    done
 }
 
 list_pegasus() {

@@ -19,7 +19,7 @@ sfcb_tools() {
 sfcb_look_for_place() {
     sfcb_place=$sfcb_directory
     if [ -z "$sfcb_place" ] && has sfcbrepos; then
-        sfcb_place=$(sfcbrepos -h 2>&1 </dev/null | sed -n 's|.*\[\(/.*\)/registration\].*|\1|p')
+        sfcb_place=$(limited sfcbrepos -h 2>&1 | sed -n 's|.*\[\(/.*\)/registration\].*|\1|p')
     fi
     sfcb_place=${sfcb_place:-/var/lib/sfcb}
     sfcb_stanza_file=$sfcb_place/registration/providerRegister
@@ -91,14 +91,14 @@ sfcb_save() {
         complain "SFCB: $sfcb_place cannot be written to; is there another --sfcb-directory?"
         return 1
     }
-    trap 'sfcb_leave "it was to end"; exit 1' HUP INT TERM
+    on_signal 'sfcb_leave "it was to end"; exit 1'
     for each in stage registration; do
         [ ! -e "$sfcb_place/$each" ] || cp -aH "$sfcb_place/$each" "$sfcb_copies/" || {
             sfcb_leave "no copy could be made of $sfcb_place/$each"
             return 1
         }
     done
-    trap 'sfcb_put_back; exit 1' HUP INT TERM
+    on_signal 'sfcb_put_back; exit 1'
 }
 
 # The originals are as they were, and the copies may not be whole.
@@ -110,20 +110,20 @@ sfcb_leave() { # REASON
 # A signal finds the copies whole, or is ignored.
 sfcb_discard() {
     [ "$dry_run" = no ] || return 0
-    trap '' HUP INT TERM
+    on_signal ''
     rm -rf "$sfcb_copies"
-    trap - HUP INT TERM
+    on_signal -
 }
 
 # Another run of sfcbrepos would not do: after a first that broke off, it deletes the last good repository.
 sfcb_put_back() {
-    trap '' HUP INT TERM
+    on_signal ''
     if sfcb_put_back_one stage && sfcb_put_back_one registration; then
         complain "SFCB: what was there before has been put back"
         sfcb_discard
     else
         complain "SFCB: what was there could not be put back: it is in $sfcb_copies"
-        trap - HUP INT TERM
+        on_signal -
     fi
 }
 
@@ -162,12 +162,19 @@ sfcb_restart() {
     done_saying "SFCB: if its server is running, it takes effect when it is restarted"
 }
 
-# A library is found by its name alone, in the directories that the configuration lists.
+# A library is found by its name alone, in the directories that the configuration lists. Where it has no line for them,
+# SFCB looks in cmpi below the directory of its own libraries, among others.
 sfcb_look_for_library() {
     [ -r "$sfcb_config" ] || return 0
-    directories=$(sed -n 's/^[[:space:]]*providerDirs:[[:space:]]*//p' "$sfcb_config")
+    directories=$(sed -n 's/^[[:space:]]*providerDirs:[[:space:]]*//p' "$sfcb_config" | tail -n 1)
     case " $directories " in
     *" $libraries "*) ;;
+    "  ")
+        case $libraries in
+        /usr/lib*/cmpi | /usr/local/lib*/cmpi) ;;
+        *) say "SFCB may not find the library: $sfcb_config has no line providerDirs, which could name $libraries" ;;
+        esac
+        ;;
     *) say "SFCB will not find the library: add $libraries to the line providerDirs in $sfcb_config" ;;
     esac
 }
@@ -203,6 +210,11 @@ sfcb_staged_stanzas() {
     for file in "$sfcb_place"/stage/regs/*.reg; do
         [ "${file##*/}" = "$former_registration" ] || cat "$file" 2>/dev/null
     done | sfcb_stanzas
+}
+
+sfcb_registered_classes() {
+    sfcb_look_for_place
+    [ -r "$sfcb_stanza_file" ] && sfcb_registered | sed 's/ .*//'
 }
 
 register_sfcb() {

@@ -1,6 +1,9 @@
 # How the classes are asked for through the object manager.
 # shellcheck shell=sh disable=SC2154 # the variables are those of the program that sources this file
 
+# These have an instance wherever they are served. Object managers answer an empty success where nobody serves a class.
+never_empty="VELKO_OstrelAgent VELKO_AssetIDDetails VELKO_ComputerSystem"
+
 # Sets the parts of the URL that clients take as options: scheme, server (host and port), user, password.
 split_url() {
     scheme=${url%%://*} server=${url#*://} user='' password=''
@@ -16,20 +19,20 @@ split_url() {
 
 # Prints the paths of a class's instances as one of the clients does.
 ask() {
-    "ask_$client" "$1" </dev/null 2>&1
+    "ask_$client" "$1" 2>&1
 }
 
 ask_wbemcli() {
     set -- "$url/$namespace:$1"
     [ "$no_verify" = no ] || set -- -noverify "$@"
-    wbemcli ein "$@"
+    limited wbemcli ein "$@"
 }
 
 ask_pywbemcli() {
     set -- instance enumerate "$1" --names-only --namespace "$namespace"
     [ -z "$user" ] || set -- --user "$user" --password "$password" "$@"
     [ "$no_verify" = no ] || set -- --no-verify "$@"
-    pywbemcli --server "$scheme://$server" "$@"
+    limited pywbemcli --server "$scheme://$server" "$@"
 }
 
 # This client takes any certificate, and finds a server of this machine best when it is told nothing.
@@ -38,7 +41,7 @@ ask_cimcli() {
     [ -z "$user" ] || set -- -u "$user" -p "$password" "$@"
     [ "$scheme" != https ] || set -- -s "$@"
     [ -z "$url_given" ] || set -- -l "$server" "$@"
-    cimcli ni "$@"
+    limited cimcli ni "$@"
 }
 
 # wbemcli says what went wrong in lines of its own.
@@ -46,12 +49,41 @@ is_error() {
     printf '%s\n' "$1" | grep -q '^\* wbemcli: '
 }
 
-verify_class() {
-    if answer=$(ask "$1") && ! is_error "$answer"; then
-        echo "$1: served, $(printf '%s\n' "$answer" | grep -c "$1\.") instances"
-    else
+# Prints the classes that are registered here, if that can be known.
+registered_classes() {
+    case $server in
+    localhost | localhost:* | 127.* | '[::1]'*) ;;
+    *) return 1 ;;
+    esac
+    [ "$sfcb$pegasus" != nono ] || return 1
+    [ "$sfcb" = no ] || sfcb_registered_classes || return 1
+    [ "$pegasus" = no ] || pegasus_registered_classes
+}
+
+has_word() { # WORDS WORD
+    printf '%s\n' "$1" | grep -qwF -- "$2"
+}
+
+verify_class() { # CLASS
+    answer=$(ask "$1")
+    ended=$?
+    if [ $ended -ne 0 ] || is_error "$answer"; then
+        [ $ended -ne 124 ] || answer="${answer:+$answer }$(what_ended $ended): $client"
         printf '%s\n' "$answer" | sed "s/^/$1: /" >&2
         failed "$1 is not served"
+        return
+    fi
+    count=$(printf '%s\n' "$answer" | grep -ci "$1\.")
+    if [ "$count" -gt 0 ]; then
+        echo "$1: served, $count instances"
+    elif has_word "$never_empty" "$1"; then
+        failed "$1 is not served: the answer is empty, and would not be"
+    elif [ "$registered_here" = unknown ]; then
+        echo "$1: no instances; served or not, the answer would be the same"
+    elif has_word "$registered_here" "$1"; then
+        echo "$1: served, 0 instances"
+    else
+        failed "$1 is not served: the answer is empty, and the class is not registered"
     fi
 }
 
@@ -64,6 +96,7 @@ verify() {
         exit 4
     fi
     split_url
+    registered_here=$(registered_classes) || registered_here=unknown
     for class in $(all_classes); do
         verify_class "$class"
     done

@@ -30,7 +30,8 @@ class Surroundings:
             (self.directory / "bin" / name).symlink_to(STAND_INS)
         self.environment = {
             **os.environ, "BUILD": str(build), "OSTREL_CONFIG": str(self.directory / "agent.toml"), "no_proxy": "*",
-            "STAND_IN": str(self.directory / "stand-in"), "PYTHONDONTWRITEBYTECODE": "1",
+            "STAND_IN": str(self.directory / "stand-in"), "LEASE_WARRANTY_LOCK": str(self.directory / "lock"),
+            "PYTHONDONTWRITEBYTECODE": "1",
             "PYTHONPATH": str(HERE / "stand-ins"),
             "PATH": f"{self.directory / 'bin'}:{build / 'bin'}:{build / 'sbin'}:{os.environ['PATH']}"}
         self.configure(f'[directories]\ndata = "{self.data_directory}"\n')

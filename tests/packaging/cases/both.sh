@@ -1,0 +1,85 @@
+# Both object managers, none, and what is asked of neither. Sourced by register-test.
+# shellcheck shell=bash disable=SC2034,SC2154 # the variables are those of machine.sh
+
+begin "Both object managers are told; one can be chosen"
+machine "${sfcb[@]}" "${pegasus[@]}"
+register register
+ends_with 0
+provider_register 6 LeaseAndWarrantyGate
+module LeaseAndWarranty LeaseAndWarrantyGate
+says "run only one of the two object managers"
+register --manager pegasus register
+says_nothing_of "run only one"
+register --manager pegasus unregister
+ends_with 0
+called_nothing_like '^sfcb'
+
+begin "One that fails does not keep the other from it"
+touch "$STAND_IN/stopped"
+register unregister
+ends_with 1
+says "SFCB: unregistered"
+
+begin "Without an object manager there is nothing to do"
+machine
+register register
+ends_with 3
+says "no object manager is installed"
+machine "${sfcb[@]}"
+register --manager pegasus register
+ends_with 3
+
+begin "A dry run shows the commands and runs none"
+machine "${sfcb[@]}" "${pegasus[@]}"
+for command in register unregister; do
+    sfcb_files >"$work/before"
+    register --dry-run $command
+    ends_with 0
+    says "would run: sfcbrepos -f"
+    says_nothing_of "registered"
+    says_nothing_of "takes effect"
+    says_nothing_of "run only one"
+    called_nothing_like '^sfcb|^cimmof|-r |^cimcli dc'
+    sfcb_is_as_in "$work/before"
+    register register
+done
+register --dry-run register
+says "would run: cimmof -n root/PG_InterOp"
+
+begin "Two runs do not change things at a time"
+machine "${sfcb[@]}"
+exec 3>"$LEASE_WARRANTY_LOCK"
+flock 3
+register --time-limit 0.1 register
+ends_with 1
+says "waiting for another run to end"
+says "nothing is done"
+called_nothing_like .
+register list
+ends_with 0
+says_nothing_of "waiting"
+register --dry-run register
+ends_with 0
+flock -u 3
+register register
+ends_with 0
+says_nothing_of "waiting"
+exec 3>&-
+provider_register 6 LeaseAndWarrantyGate
+ln -sf /nowhere/lock "$LEASE_WARRANTY_LOCK"
+register register
+ends_with 0
+
+begin "Wrong usage is told, and nothing is done"
+for arguments in "" "frobnicate" "register list" "--provider best register" "--provider" "--manager owner list" "--time-limit soon list"; do
+    # shellcheck disable=SC2086 # several words
+    register $arguments
+    ends_with 2
+    says "--help"
+    called_nothing_like .
+done
+register --help
+ends_with 0
+says "Exit status"
+register --version
+ends_with 0

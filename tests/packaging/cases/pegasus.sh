@@ -1,0 +1,277 @@
+# OpenPegasus. Sourced by register-test.
+# shellcheck shell=bash disable=SC2034,SC2154 # the variables are those of machine.sh
+
+begin "OpenPegasus: registers classes, then providers"
+machine "${pegasus[@]}"
+register register
+ends_with 0
+says "OpenPegasus: registered LeaseAndWarrantyGate"
+in_order '^cimmof -uc -n root/cimv2 .*/VELKO_ComputerSystem.mof .*/VELKO_AssetIDDetails.mof$' '^cimmof -n root/PG_InterOp .*/pegasus/LeaseAndWarrantyGate.mof' \
+    '^cimmof -n root/PG_InterOp .*/pegasus/OstrelComputerSystemProvider.mof'
+called_nothing_like '^cimprovider -r'
+module LeaseAndWarranty LeaseAndWarrantyGate
+module OstrelComputerSystem OstrelComputerSystemProvider
+
+begin "OpenPegasus: what was registered is removed first, or it would stay"
+register --provider bare register
+ends_with 0
+in_order '^cimprovider -r -m LeaseAndWarranty$' '^cimmof -n root/PG_InterOp .*/pegasus/LeaseAndWarrantyProvider.mof'
+module LeaseAndWarranty LeaseAndWarrantyProvider
+
+begin "OpenPegasus: the computers that an earlier version has registered under another name are replaced"
+for result in 0 1; do
+    machine "${pegasus[@]}"
+    register register
+    echo ComputerSystemProvider >"$STAND_IN/modules/OstrelComputerSystem"
+        [ $result = 0 ] || touch "$STAND_IN/refused/LeaseAndWarrantyProvider"
+    register register --provider bare
+    ends_with $result
+    module OstrelComputerSystem OstrelComputerSystemProvider
+done
+machine "${pegasus[@]}"
+register register
+register --provider bare register
+
+begin "OpenPegasus: lists what is registered"
+register list
+ends_with 0
+says "OpenPegasus: module LeaseAndWarranty, provider LeaseAndWarrantyProvider"
+
+begin "OpenPegasus: unregistering removes modules and classes, those that refer to others first, and can be repeated"
+register unregister
+ends_with 0
+in_order '^cimprovider -r -m LeaseAndWarranty$' '^cimcli dc -n root/cimv2 VELKO_LeaseSetting' \
+    '^cimcli dc -n root/cimv2 VELKO_Lease$'
+register unregister
+ends_with 0
+called_nothing_like '^cimprovider -r|^cimcli dc'
+register list
+says "OpenPegasus: nothing is registered"
+
+begin "OpenPegasus: without cimcli the classes stay"
+machine cimmof cimprovider
+register register
+register unregister
+ends_with 0
+says "the class definitions stay"
+
+begin "OpenPegasus: needs its server, and says so"
+machine "${pegasus[@]}"
+touch "$STAND_IN/stopped"
+for command in register unregister list; do
+    register $command
+    ends_with 1
+    says "start cimserver"
+done
+
+begin "OpenPegasus: the standard qualifiers where they are asked for"
+machine "${pegasus[@]}"
+register --with-qualifiers register
+in_order '^cimmof -uc -n root/cimv2 [^ ]*/qualifiers.mof$' '^cimmof -uc -n root/cimv2 [^ ]*/VELKO_ComputerSystem.mof .*'
+
+begin "OpenPegasus: classes that are refused leave what is registered"
+register register
+echo 0 >"$STAND_IN/fail/cimmof"
+register register --provider bare
+ends_with 1
+says "OpenPegasus: not registered"
+says "module LeaseAndWarranty, provider LeaseAndWarrantyGate"
+module LeaseAndWarranty LeaseAndWarrantyGate
+called_nothing_like '^cimprovider -r'
+
+begin "OpenPegasus: where a provider is refused, the former one comes back"
+machine "${pegasus[@]}"
+register register
+touch "$STAND_IN/refused/LeaseAndWarrantyProvider"
+register register --provider bare
+ends_with 1
+says "trying to register LeaseAndWarrantyGate again"
+says "module LeaseAndWarranty, provider LeaseAndWarrantyGate"
+says "module OstrelComputerSystem, provider OstrelComputerSystemProvider"
+module LeaseAndWarranty LeaseAndWarrantyGate
+
+begin "OpenPegasus: where a former one cannot be removed, those that could come back"
+machine "${pegasus[@]}"
+register register
+mkdir "$STAND_IN/kept"
+touch "$STAND_IN/kept/OstrelComputerSystem"
+register register --provider bare
+ends_with 1
+says "OpenPegasus: not registered"
+in_order '^cimprovider -r -m LeaseAndWarranty$' '^cimmof -n root/PG_InterOp .*/LeaseAndWarrantyGate.mof$'
+called_nothing_like '^cimmof .*PG_InterOp .*ComputerSystem'
+module LeaseAndWarranty LeaseAndWarrantyGate
+module OstrelComputerSystem OstrelComputerSystemProvider
+
+begin "OpenPegasus: computers that were registered alone come back too"
+machine "${pegasus[@]}"
+register register
+rm "$STAND_IN/modules/LeaseAndWarranty"
+touch "$STAND_IN/refused/LeaseAndWarrantyGate"
+register register
+ends_with 1
+module OstrelComputerSystem OstrelComputerSystemProvider
+
+begin "OpenPegasus: what is registered is told where only a part is"
+machine "${pegasus[@]}"
+touch "$STAND_IN/refused/OstrelComputerSystemProvider"
+register register
+ends_with 1
+says "not registered as it should be"
+says "module LeaseAndWarranty, provider LeaseAndWarrantyGate"
+says_nothing_of "module OstrelComputerSystem"
+
+begin "OpenPegasus: a module that cannot be removed is not registered over"
+for calls in 4 5; do # to list them once more, to remove one
+    machine "${pegasus[@]}"
+    register register
+    echo $calls >"$STAND_IN/fail/cimprovider"
+    register register --provider bare
+    ends_with 1
+    says "OpenPegasus: not registered"
+    called_nothing_like '^cimmof .*PG_InterOp'
+done
+
+begin "OpenPegasus: without an option the provider that is registered stays, and renewing registers nothing new"
+machine "${pegasus[@]}"
+register --only-registered register
+ends_with 0
+says "nothing is renewed"
+called_nothing_like '^cimmof|^cimprovider -r'
+register --provider bare register
+for option in --restart --only-registered; do
+    register register $option
+    ends_with 0
+    called 'cimmof .*/pegasus/LeaseAndWarrantyProvider.mof'
+    module LeaseAndWarranty LeaseAndWarrantyProvider
+done
+
+begin "OpenPegasus: computers that another agent's provider serves are left to it"
+machine "${pegasus[@]}"
+rm "$work/prefix/lib/libOstrelComputerSystemProvider.so"
+mkdir -p "$STAND_IN/classes"
+echo "of another agent" >"$STAND_IN/classes/VELKO_ComputerSystem"
+echo VELKO_ComputerSystem >"$STAND_IN/served-by-others"
+register register
+ends_with 0
+module LeaseAndWarranty LeaseAndWarrantyGate
+called_nothing_like '^cimmof.*ComputerSystem'
+register unregister
+ends_with 0
+called_nothing_like '^cimcli dc .*ComputerSystem'
+called 'cimcli dc -n root/cimv2 VELKO_Lease'
+
+begin "OpenPegasus: nor is their class changed where it cannot be seen"
+machine cimmof cimprovider
+rm "$work/prefix/lib/libOstrelComputerSystemProvider.so"
+mkdir -p "$STAND_IN/classes"
+echo "of another agent" >"$STAND_IN/classes/VELKO_ComputerSystem"
+register register
+ends_with 0
+says "VELKO_ComputerSystem may be declared already"
+grep -q "another agent" "$STAND_IN/classes/VELKO_ComputerSystem" || complain "the class is not what it was"
+module LeaseAndWarranty LeaseAndWarrantyGate
+
+begin "OpenPegasus: computers that nobody serves are declared, since associations refer to them, and go again"
+for client in cimcli none; do
+    machine cimmof cimprovider $client
+    rm "$work/prefix/lib/libOstrelComputerSystemProvider.so"
+    register register
+    ends_with 0
+    says_nothing_of "may be declared already"
+    [ -e "$STAND_IN/classes/VELKO_ComputerSystem" ] || complain "the class is not declared"
+    register unregister
+    ends_with 0
+    [ $client = none ] || [ -z "$(ls "$STAND_IN/classes")" ] || complain "$(ls "$STAND_IN/classes") stays"
+done
+
+begin "OpenPegasus: the computers of an agent that is gone are taken back"
+machine "${pegasus[@]}"
+register register
+rm "$work/prefix/lib/libOstrelComputerSystemProvider.so"
+register --only-registered register
+ends_with 0
+[ "$(ls "$STAND_IN/modules")" = LeaseAndWarranty ] || complain "$(ls "$STAND_IN/modules") are registered"
+register unregister
+ends_with 0
+[ -z "$(ls "$STAND_IN/classes")" ] || complain "$(ls "$STAND_IN/classes") stays"
+
+begin "OpenPegasus: the namespace of registrations is found, and none is made"
+for place in root/interop interop; do
+    machine "${pegasus[@]}"
+    echo $place >"$STAND_IN/interop"
+    register register
+    ends_with 0
+    called "cimmof -n $place .*/pegasus/LeaseAndWarrantyGate.mof"
+    module OstrelComputerSystem OstrelComputerSystemProvider
+    [ ! -e "$STAND_IN/namespaces" ] || complain "a namespace is made" "$STAND_IN/namespaces"
+done
+
+begin "OpenPegasus: another namespace of registrations is named"
+echo root/elsewhere >"$STAND_IN/interop"
+for option in "" "--interop root/mistyped"; do
+    # shellcheck disable=SC2086 # two words
+    register register $option
+    ends_with 1
+    says "has the class PG_ProviderModule"
+    called_nothing_like '^cimmof|^cimprovider -r'
+done
+register register --interop root/elsewhere
+ends_with 0
+called 'cimmof -n root/elsewhere .*/pegasus/LeaseAndWarrantyGate.mof'
+machine cimmof cimprovider
+echo root/interop >"$STAND_IN/interop"
+register register --interop root/interop
+ends_with 0
+module LeaseAndWarranty LeaseAndWarrantyGate
+
+begin "OpenPegasus: a signal leaves nothing undone"
+for signal in TERM INT HUP QUIT; do
+    machine "${pegasus[@]}"
+    register register --provider bare
+    for command in "cimprovider -r" cimmof "cimcli dc"; do
+        echo $signal >"$STAND_IN/end/$command"
+    done
+    register register --provider gate
+    ends_with 0
+    module LeaseAndWarranty LeaseAndWarrantyGate
+    module OstrelComputerSystem OstrelComputerSystemProvider
+    register unregister
+    ends_with 0
+    [ -z "$(find "$STAND_IN/modules" "$STAND_IN/classes" -type f)" ] || complain "something is still registered"
+done
+
+begin "OpenPegasus: who listens no more does not end the work"
+machine "${pegasus[@]}"
+register register --provider bare
+exec 3> >(exit 0)
+wait $!
+status=0
+command_itself register --provider gate >&3 2>"$work/output" || status=$?
+exec 3>&-
+ends_with 0
+module LeaseAndWarranty LeaseAndWarrantyGate
+
+begin "OpenPegasus: a command that does not end is ended"
+machine "${pegasus[@]}"
+touch "$STAND_IN/hang/cimprovider"
+for command in register unregister list; do
+    register --time-limit 0.1 $command
+    ends_with 1
+    says "its server does not answer"
+done
+rm "$STAND_IN/hang/cimprovider"
+register register --provider bare
+touch "$STAND_IN/hang/cimmof"
+register --time-limit 0.1 register --provider gate
+ends_with 1
+says "did not end within 0.1 seconds: cimmof"
+module LeaseAndWarranty LeaseAndWarrantyProvider
+
+begin "OpenPegasus: a provider directory that does not name the library's is a warning"
+machine "${pegasus[@]}"
+register register
+says "set providerDir to a list with $work/prefix/lib"
+echo "$work/prefix/lib" >"$STAND_IN/providerDir"
+register register
+says_nothing_of "providerDir"

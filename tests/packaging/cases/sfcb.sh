@@ -1,0 +1,325 @@
+# SFCB. Sourced by register-test.
+# shellcheck shell=bash disable=SC2034,SC2154 # the variables are those of machine.sh
+
+begin "SFCB: registers the gate and the computers, and rebuilds the repository last"
+machine "${sfcb[@]}"
+register register
+ends_with 0
+says "SFCB: registered LeaseAndWarrantyGate"
+says "running: sfcbrepos -f"
+says "takes effect when it is restarted"
+in_order '^sfcbunstage' '^sfcbstage -r .*/gate/LeaseAndWarrantyGate.reg .*/VELKO_Lease.mof .*/VELKO_AssetIDDetails.mof' \
+    '^sfcbstage -r .*/OstrelComputerSystemProvider.reg' '^sfcbrepos -f$'
+provider_register 6 LeaseAndWarrantyGate
+provider_register 1 OstrelComputerSystemProvider
+[ "$(find "$STAND_IN/sfcb/stage/mofs" -name 'VELKO_*.mof' | wc -l)" -eq 7 ] || complain "not every class is staged"
+
+begin "SFCB: the bare provider takes the gate's place"
+register --provider bare register
+ends_with 0
+provider_register 6 LeaseAndWarrantyProvider
+provider_register 0 LeaseAndWarrantyGate
+
+begin "SFCB: without an option, the provider that is registered stays"
+register register
+ends_with 0
+provider_register 6 LeaseAndWarrantyProvider
+
+begin "SFCB: registering again changes nothing"
+cp "$STAND_IN/sfcb/registration/providerRegister" "$work/before"
+register register --provider bare
+ends_with 0
+cmp "$work/before" "$STAND_IN/sfcb/registration/providerRegister" || complain "the registration is another"
+
+begin "SFCB: lists what is registered"
+register list
+ends_with 0
+says "SFCB: VELKO_Lease by LeaseAndWarrantyProvider"
+says "SFCB: VELKO_ComputerSystem by OstrelComputerSystemProvider"
+
+begin "SFCB: unregistering leaves nothing, and can be repeated"
+register unregister
+ends_with 0
+says "SFCB: unregistered"
+provider_register 0 LeaseAndWarrantyProvider
+[ "$(find "$STAND_IN/sfcb/stage" -type f)" = "$STAND_IN/sfcb/stage/default.reg" ] || complain "something is still staged"
+[ -z "$(find "$STAND_IN/sfcb" -name 'before-*')" ] || complain "copies are left"
+register unregister
+ends_with 0
+register list
+says "SFCB: nothing is registered"
+
+begin "SFCB: a directory of its own is passed on"
+sfcb_installation "$work/elsewhere"
+register --sfcb-directory "$work/elsewhere" register
+ends_with 0
+called "sfcbrepos -f -s $work/elsewhere/stage -r $work/elsewhere/registration"
+grep -q LeaseAndWarrantyGate "$work/elsewhere/registration/providerRegister" || complain "not registered there"
+
+begin "SFCB: what cannot be staged or compiled leaves all as it was, the instances of others and our own registration"
+for obstacle in staging compiling; do
+    machine "${sfcb[@]}"
+    printf '[Other]\n   provider: Other\n#\n' >"$STAND_IN/sfcb/stage/regs/Other.reg"
+    register register --provider bare
+    ends_with 0
+    case $obstacle in
+    staging) echo 0 >"$STAND_IN/fail/sfcbstage" ;;
+    compiling) echo "broken" >"$STAND_IN/sfcb/stage/mofs/root/cimv2/Other.mof" ;;
+    esac
+    sfcb_files >"$work/before"
+    for command in "register --provider gate" unregister; do
+        [ "$obstacle $command" != "staging unregister" ] || continue
+        # shellcheck disable=SC2086 # several words
+        register $command
+        ends_with 1
+        says "SFCB: not ${command%% *}ed"
+        says "what was there before has been put back"
+        sfcb_is_as_in "$work/before"
+        [ -z "$(find "$STAND_IN/sfcb" -name 'before-*')" ] || complain "copies are left"
+    done
+    provider_register 6 LeaseAndWarrantyProvider
+done
+
+begin "SFCB: directories that are links stay links when they are put back"
+machine "${sfcb[@]}"
+mkdir "$work/elsewhere"
+for directory in stage registration; do
+    mv "$STAND_IN/sfcb/$directory" "$work/elsewhere/"
+    ln -s "../../elsewhere/$directory" "$STAND_IN/sfcb/$directory"
+done
+mkdir "$work/elsewhere/stage/mofs"
+echo "broken" >"$work/elsewhere/stage/mofs/Other.mof"
+cp -R "$work/elsewhere" "$work/before"
+register register
+ends_with 1
+says "what was there before has been put back"
+diff -r "$work/before" "$work/elsewhere" >"$work/output" || complain "the directories are not as they were"
+for directory in stage registration; do
+    [ "$(readlink "$STAND_IN/sfcb/$directory")" = "../../elsewhere/$directory" ] || complain "$directory is no link any more"
+done
+[ -z "$(find "$STAND_IN/sfcb" -name 'before-*')" ] || complain "copies are left"
+
+begin "SFCB: what cannot be put back is told, and where it is"
+machine "${sfcb[@]}" mv
+echo "broken" >"$STAND_IN/sfcb/stage/Other.mof"
+mkdir -p "$STAND_IN/sfcb/stage/mofs"
+echo "broken" >"$STAND_IN/sfcb/stage/mofs/Other.mof"
+echo 1 >"$STAND_IN/fail/mv"
+register register
+ends_with 1
+says "could not be put back: it is in $STAND_IN/sfcb/before-"
+says_nothing_of "has been put back"
+grep -q "static instance" "$STAND_IN"/sfcb/before-*/registration/repository/instances || complain "the copy is not there"
+
+begin "SFCB: without a copy nothing is begun"
+machine "${sfcb[@]}" cp
+echo 0 >"$STAND_IN/fail/cp"
+sfcb_files >"$work/before"
+register register
+ends_with 1
+says "nothing is changed"
+called_nothing_like '^sfcb'
+sfcb_is_as_in "$work/before"
+
+begin "SFCB: a signal leaves all as it was, whenever it comes before the end"
+for command in cp sfcbunstage sfcbstage sfcbrepos "sfcbstage QUIT" "sfcbstage INT" "sfcbstage HUP"; do
+    signal=${command#* }
+    command=${command% *}
+    machine "${sfcb[@]}" cp
+    register register --provider bare
+    sfcb_files >"$work/before"
+    [ "$signal" != "$command" ] || signal=TERM
+    echo "$signal" >"$STAND_IN/end/$command"
+    register register --provider gate
+    ends_with 1
+    called "$command .*"
+    if [ "$command" = cp ]; then says "nothing is changed"; else says "has been put back"; fi
+    sfcb_is_as_in "$work/before"
+    [ -z "$(find "$STAND_IN/sfcb" -name 'before-*')" ] || complain "copies are left"
+done
+
+begin "SFCB: a signal keeps nobody from putting back, nor from ending when all is done"
+machine "${sfcb[@]}" mv
+register register --provider bare
+mkdir -p "$STAND_IN/sfcb/stage/mofs"
+echo "broken" >"$STAND_IN/sfcb/stage/mofs/Other.mof"
+sfcb_files >"$work/before"
+echo TERM >"$STAND_IN/end/mv"
+register register --provider gate
+ends_with 1
+says "has been put back"
+sfcb_is_as_in "$work/before"
+machine "${sfcb[@]}" rm
+echo TERM >"$STAND_IN/end/rm"
+register register
+ends_with 0
+provider_register 6 LeaseAndWarrantyGate
+[ -z "$(find "$STAND_IN/sfcb" -name 'before-*')" ] || complain "copies are left"
+
+begin "SFCB: who listens no more does not end the work"
+machine "${sfcb[@]}"
+register register --provider bare
+for streams in one both; do
+    exec 3> >(exit 0)
+    wait $!
+    status=0
+    if [ $streams = one ]; then
+        command_itself register --provider gate >&3 2>"$work/output" || status=$?
+    else
+        : >"$work/output"
+        command_itself unregister >&3 2>&3 || status=$?
+    fi
+    exec 3>&-
+    ends_with 0
+    if [ $streams = one ]; then provider_register 6 LeaseAndWarrantyGate; else provider_register 0 LeaseAndWarrantyGate; fi
+    provider_register 0 LeaseAndWarrantyProvider
+    [ -z "$(find "$STAND_IN/sfcb" -name 'before-*')" ] || complain "copies are left"
+done
+
+begin "SFCB: a command that does not end is ended, and all is as it was"
+machine "${sfcb[@]}"
+register register --provider bare
+sfcb_files >"$work/before"
+touch "$STAND_IN/hang/sfcbrepos"
+register --time-limit 0.1 --provider gate register
+ends_with 1
+says "did not end within 0.1 seconds: sfcbrepos -f"
+says "has been put back"
+sfcb_is_as_in "$work/before"
+
+begin "SFCB: a staged file that stays though its command answers success is told"
+machine "${sfcb[@]}"
+mkdir -p "$STAND_IN/sfcb/stage/regs/LeaseAndWarrantyProvider.reg/in-the-way"
+register register
+ends_with 1
+says "stage/regs/LeaseAndWarrantyProvider.reg could not be deleted"
+
+begin "SFCB: a command that is missing is named"
+machine sfcbrepos sfcbstage
+register register
+ends_with 1
+says "without its command sfcbunstage"
+called_nothing_like .
+
+begin "SFCB: renewing registers with nobody who was not registered with, and keeps the provider"
+machine "${sfcb[@]}"
+register --only-registered register
+ends_with 0
+says "nothing is renewed"
+called_nothing_like .
+register --provider bare register
+rm "$STAND_IN/sfcb/stage/mofs/root/cimv2/VELKO_Lease.mof"
+register --only-registered register
+ends_with 0
+provider_register 6 LeaseAndWarrantyProvider
+[ -e "$STAND_IN/sfcb/stage/mofs/root/cimv2/VELKO_Lease.mof" ] || complain "the classes are not renewed"
+
+begin "SFCB: a running server is restarted when that is asked for, and named otherwise"
+machine "${sfcb[@]}" systemctl
+echo sblim-sfcb >"$STAND_IN/unit"
+register register
+ends_with 0
+says "systemctl restart sblim-sfcb"
+called_nothing_like '^systemctl restart'
+register register --restart
+ends_with 0
+called "systemctl restart sblim-sfcb"
+
+begin "SFCB: a configuration that does not name the library's directory is a warning"
+echo "providerDirs: /usr/lib /elsewhere" >"$work/sfcb.cfg"
+register register
+ends_with 0
+says "add $work/prefix/lib to the line providerDirs in $work/sfcb.cfg"
+echo "providerDirs: /usr/lib $work/prefix/lib" >"$work/sfcb.cfg"
+register register
+says_nothing_of "providerDirs"
+
+begin "SFCB: a configuration that names no directories is a warning where SFCB would not look of itself"
+echo "httpPort: 5988" >"$work/sfcb.cfg"
+register register
+ends_with 0
+says "which could name $work/prefix/lib"
+# shellcheck disable=SC2016 # it is the command that expands it
+sed -i 's|^libraries=\$(readlink.*|libraries=/usr/lib/x86_64-linux-gnu/cmpi|' "$work/prefix/sbin/lease-warranty-register"
+register register
+ends_with 0
+says_nothing_of "providerDirs"
+
+begin "SFCB: computers that another agent's provider serves are left to it"
+machine "${sfcb[@]}" wbemcli
+rm "$work/prefix/lib/libOstrelComputerSystemProvider.so"
+mkdir -p "$STAND_IN/sfcb/stage/mofs/root/cimv2"
+printf '[VELKO_ComputerSystem]\n   provider: Other\n#\n' >"$STAND_IN/sfcb/stage/regs/Other.reg"
+echo "// of another agent" >"$STAND_IN/sfcb/stage/mofs/root/cimv2/VELKO_ComputerSystem.mof"
+register register
+ends_with 0
+provider_register 0 OstrelComputerSystemProvider
+provider_register 6 LeaseAndWarrantyGate
+register verify
+ends_with 0
+says "VELKO_Lease: served"
+says "VELKO_ComputerSystem: served"
+echo VELKO_ComputerSystem >"$STAND_IN/broken"
+register verify
+ends_with 1
+says "VELKO_ComputerSystem is not served"
+register unregister
+ends_with 0
+called_nothing_like 'ComputerSystem'
+grep -q "another agent" "$STAND_IN/sfcb/stage/mofs/root/cimv2/VELKO_ComputerSystem.mof" || complain "its class is gone"
+provider_register 1 Other
+
+begin "SFCB: computers that nobody serves are declared, since associations refer to them"
+rm "$STAND_IN/sfcb/stage/regs/Other.reg"
+register register
+ends_with 0
+grep -q "^class VELKO_ComputerSystem" "$STAND_IN/sfcb/stage/mofs/root/cimv2/VELKO_ComputerSystem.mof" ||
+    complain "the class is not staged"
+provider_register 0 OstrelComputerSystemProvider
+
+begin "SFCB: the computers of an agent that is gone are taken back"
+machine "${sfcb[@]}"
+register register
+provider_register 1 OstrelComputerSystemProvider
+rm "$work/prefix/lib/libOstrelComputerSystemProvider.so"
+register --only-registered register
+ends_with 0
+provider_register 0 OstrelComputerSystemProvider
+provider_register 6 LeaseAndWarrantyGate
+
+# As an earlier version has staged it; another's registration may have that name as well.
+former_computers() { # GROUP
+    mkdir -p "$STAND_IN/sfcb/stage/regs"
+    sed "s/OstrelComputerSystemProvider/ComputerSystemProvider/; s/group: .*/group: $1/" \
+        "$work/prefix/$data/OstrelComputerSystemProvider.reg" >"$STAND_IN/sfcb/stage/regs/ComputerSystemProvider.reg"
+}
+
+begin "SFCB: the computers that an earlier version has registered under another name are taken back"
+for command in register unregister; do
+    for library in libOstrelComputerSystemProvider.so none; do
+        machine "${sfcb[@]}"
+        [ $library != none ] || rm "$work"/prefix/lib/libOstrelComputerSystemProvider.so
+        former_computers LeaseAndWarranty
+        sfcbrepos_of_stage
+        provider_register 1 ComputerSystemProvider
+        register --dry-run $command
+        says "would run: sfcbunstage -r ComputerSystemProvider.reg"
+        register $command
+        ends_with 0
+        provider_register 0 ComputerSystemProvider
+        [ "$command $library" = "register none" ] || [ $command = unregister ] ||
+            provider_register 1 OstrelComputerSystemProvider
+        [ $command = unregister ] || [ -e "$STAND_IN/sfcb/stage/mofs/root/cimv2/VELKO_ComputerSystem.mof" ] ||
+            complain "the class is not staged"
+    done
+done
+
+begin "SFCB: somebody else's registration of that name stays"
+machine "${sfcb[@]}"
+former_computers Other
+for command in register unregister; do
+    register $command
+    ends_with 0
+    provider_register 1 ComputerSystemProvider
+    called_nothing_like ' ComputerSystemProvider.reg'
+done
