@@ -11,7 +11,7 @@ failures=0
 
 # Object managers and clients that are installed here are not to be found: of the system, there is what the command
 # and the stand-ins need.
-for tool in awk bash cat cp dirname env find flock grep head ls mkdir mktemp mv readlink rm sed sh sleep sort tac tail tee \
+for tool in awk bash cat cp dirname env find flock grep head ls mkdir mktemp mv readlink rm rmdir sed sh sleep sort tac tail tee \
     timeout touch xargs; do
     ln -s "$(command -v "$tool")" "$tools/"
 done
