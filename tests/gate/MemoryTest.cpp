@@ -9,6 +9,8 @@
 #include <functional>
 #include <new>
 
+#include "support/UnderTest.h"
+
 // Memory that runs out anywhere on the way through the gate.
 
 namespace {
@@ -209,7 +211,7 @@ TEST(FactoryMemoryTest, WhateverAllocationFailsNothingIsThrown) {
     bool goesOn = true;
     for (long number = 1; goesOn; ++number) {
         testsupport::RecordingBroker broker;
-        testsupport::ProviderLibrary library(GATE_LIBRARY, "LeaseAndWarrantyGate", broker);
+        testsupport::ProviderLibrary library(testsupport::underTest(GATE_LIBRARY), "LeaseAndWarrantyGate", broker);
         auto* factory = library.function<CMPIInstanceMI*(const CMPIBroker*, const CMPIContext*, CMPIStatus*)>(
             "LeaseAndWarrantyGate_Create_InstanceMI");
         CMPIStatus status{CMPI_RC_OK, nullptr};
