@@ -1,4 +1,4 @@
-"""Finds texts for people among the literals of C++ sources."""
+"""Finds texts for people among the literals of C++ sources, and in what the command that registers says."""
 
 import re
 
@@ -6,7 +6,7 @@ from pages import ROOT
 
 TOKEN = re.compile(r'//[^\n]*|/\*.*?\*/|#include[^\n]*|static_assert\([^;]*;'
                    r'|\'(?:\\.|[^\'\\\n])\'|"(?:\\.|[^"\\\n])*"', re.S)
-ESCAPES = {"n": "\n", "t": "\t", "0": "\0"}
+ESCAPES = {"n": "\n", "r": "\r", "t": "\t", "0": "\0"}
 
 
 def files(*folders):
@@ -34,3 +34,14 @@ def is_prose(text):
     several = re.search(r"[A-Za-z][,.;:)'\"]* +[(\"']?[A-Za-z]", text)
     part = re.search(r"^ .*[A-Za-z]|[A-Za-z].* $", text)
     return bool(several or part) and not re.fullmatch(r" \w+=?", text)
+
+
+SAID = re.compile(r'echo "\$\{lines:-([^}]*)\}"'
+                  r'|\b(?:say|complain|failed|done_saying|wrong_usage|sfcb_leave|echo) "((?:[^"\\]|\\.)*)"')
+VALUE = re.compile(r"\$\([^)]*\)|\$\{[^}]*\}|\$\w+|\$[@*?]|@\w+@")
+
+
+def said(text, placeholder):
+    """What a shell script says to people, with a word in the place of each value."""
+    texts = [VALUE.sub(placeholder, each[1] or each[2] or "") for each in SAID.finditer(text)]
+    return [each for each in texts if is_prose(each.replace(placeholder, ""))]
