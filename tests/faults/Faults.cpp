@@ -168,7 +168,7 @@ const std::vector<Failure>& fileFailures() {
         {operationOpen, EMFILE},   {operationOpen, EACCES},      {operationRead, EIO},       {operationRead, EINTR},
         {operationRead, 0},        {operationWrite, ENOSPC},     {operationWrite, EINTR},    {operationWrite, 0},
         {operationSync, EIO},      {operationRename, ENOSPC},    {operationRemove, EACCES},  {operationClose, EIO},
-        {operationStatus, EACCES}, {operationAttributes, EPERM}, {operationResolve, EACCES},
+        {operationStatus, EACCES}, {operationAttributes, EPERM}, {operationResolve, EACCES}, {operationSeek, EIO},
     };
     return all;
 }

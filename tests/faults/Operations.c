@@ -8,7 +8,9 @@
 #include <stdio.h>
 #include <stdlib.h>
 #include <string.h>
+#include <sys/socket.h>
 #include <sys/stat.h>
+#include <sys/statvfs.h>
 #include <sys/uio.h>
 #include <unistd.h>
 
@@ -198,6 +200,9 @@ STAND_BEFORE_TEMPORARY(mkostemp)
 STAND_BEFORE_TEMPORARY(mkostemp64)
 STAND_BEFORE_STREAM(fopen)
 STAND_BEFORE_STREAM(fopen64)
+STAND_BEFORE(operationOpen, NULL, FILE*, fdopen, (int file, const char* mode), (file, mode))
+STAND_BEFORE(operationOpen, -1, int, socket, (int domain, int type, int protocol), (domain, type, protocol))
+STAND_BEFORE_PATH(operationOpen, -1, int, mkdir, (const char* path, mode_t mode), (path, mode))
 
 STAND_BEFORE_TRANSFER(operationRead, -1, ssize_t, read, (int file, void* data, size_t size), size, (file, data, size))
 STAND_BEFORE_TRANSFER(operationWrite, -1, ssize_t, write, (int file, const void* data, size_t size), size,
@@ -206,11 +211,13 @@ STAND_BEFORE_TRANSFER(operationWrite, -1, ssize_t, writev, (int file, const stru
                       (file, parts, count))
 STAND_BEFORE_TRANSFER(operationWrite, 0, size_t, fwrite, (const void* data, size_t size, size_t count, FILE* file),
                       count, (data, size, count, file))
+STAND_BEFORE(operationWrite, -1, ssize_t, sendto,
+             (int file, const void* data, size_t size, int flags, __CONST_SOCKADDR_ARG address, socklen_t length),
+             (file, data, size, flags, address, length))
 STAND_BEFORE(operationWrite, EOF, int, fflush, (FILE * file), (file))
 STAND_BEFORE(operationSeek, -1, off_t, lseek, (int file, off_t offset, int whence), (file, offset, whence))
 STAND_BEFORE(operationSeek, -1, off64_t, lseek64, (int file, off64_t offset, int whence), (file, offset, whence))
 STAND_FOR_SYNC(fsync)
-STAND_FOR_SYNC(fdatasync)
 STAND_BEFORE(operationRename, -1, int, rename, (const char* from, const char* to), (from, to))
 STAND_BEFORE(operationRemove, -1, int, unlink, (const char* path), (path))
 STAND_BEFORE(operationRemove, -1, int, remove, (const char* path), (path))
@@ -220,6 +227,7 @@ STAND_BEFORE_PATH(operationStatus, -1, int, stat, (const char* path, struct stat
 STAND_BEFORE_PATH(operationStatus, -1, int, stat64, (const char* path, struct stat64* status), (path, status))
 STAND_BEFORE(operationStatus, -1, int, fstat, (int file, struct stat* status), (file, status))
 STAND_BEFORE(operationStatus, -1, int, fstat64, (int file, struct stat64* status), (file, status))
+STAND_BEFORE_PATH(operationStatus, -1, int, statvfs, (const char* path, struct statvfs* status), (path, status))
 STAND_BEFORE_PATH(operationStatus, -1, int, access, (const char* path, int mode), (path, mode))
 STAND_BEFORE(operationAttributes, -1, int, fchmod, (int file, mode_t mode), (file, mode))
 STAND_BEFORE(operationAttributes, -1, int, fchown, (int file, uid_t owner, gid_t group), (file, owner, group))

@@ -13,15 +13,15 @@ extern "C" {
 enum OperationKind {
     operationAllocate,   /**< operator new, which is not of the system: Faults.cpp replaces it */
     operationTakeMemory, /**< malloc, calloc, realloc, but for operator new; with sanitizers, none is seen */
-    operationOpen,       /**< open, openat, mkostemp, fopen */
+    operationOpen,       /**< open, openat, mkostemp, fopen, fdopen, mkdir, socket */
     operationRead,       /**< read */
-    operationWrite,      /**< write, writev, fwrite, fflush */
+    operationWrite,      /**< write, writev, fwrite, fflush, sendto */
     operationSeek,       /**< lseek */
-    operationSync,       /**< fsync, fdatasync */
+    operationSync,       /**< fsync */
     operationRename,     /**< rename */
     operationRemove,     /**< unlink, remove */
     operationClose,      /**< close, fclose: what is open is closed all the same */
-    operationStatus,     /**< stat, fstat, access */
+    operationStatus,     /**< stat, fstat, statvfs, access */
     operationAttributes, /**< fchmod, fchown */
     operationResolve,    /**< realpath */
     operationKinds

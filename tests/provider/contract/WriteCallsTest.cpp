@@ -1,12 +1,17 @@
 #include "RecordFixture.h"
+#include "support/Files.h"
 
+#include <fcntl.h>
+#include <gmock/gmock.h>
+#include <sys/stat.h>
 #include <sys/syscall.h>
 #include <sys/uio.h>
 #include <unistd.h>
 
 #include <sstream>
 
-// What a rewrite asks of the system for each line of the record file.
+// What a rewrite asks of the system for each line of the record file: seen are all functions of the C library by which
+// an open file is written, or something else is done with it.
 
 namespace {
 
@@ -62,19 +67,44 @@ ssize_t writev(int descriptor, const struct iovec* parts, int count) {
     return syscall(SYS_writev, descriptor, parts, count);
 }
 
-off64_t lseek64(int descriptor, off64_t offset, int whence) noexcept {
-    if (Watch* watch = Watch::over(descriptor)) {
-        ++watch->others;
+/**
+ * Another function for an open file, of the system call of that number. Under a name of its own in this source, which
+ * spares it the parameters and qualifiers of the C library's declaration.
+ */
+#define COUNTED(name, number)                                                                             \
+    long counted_##name(int descriptor, long first, long second, long third, long fourth) __asm__(#name); \
+    long counted_##name(int descriptor, long first, long second, long third, long fourth) {               \
+        if (Watch* watch = Watch::over(descriptor)) {                                                     \
+            ++watch->others;                                                                              \
+        }                                                                                                 \
+        return syscall(number, descriptor, first, second, third, fourth);                                 \
     }
-    return syscall(SYS_lseek, descriptor, offset, whence);
-}
 
-int fsync(int descriptor) {
-    if (Watch* watch = Watch::over(descriptor)) {
-        ++watch->others;
-    }
-    return static_cast<int>(syscall(SYS_fsync, descriptor));
-}
+// CMakeLists.txt has the same names.
+COUNTED(close, SYS_close)
+COUNTED(dup, SYS_dup)
+COUNTED(fallocate, SYS_fallocate)
+COUNTED(fallocate64, SYS_fallocate)
+COUNTED(fchmod, SYS_fchmod)
+COUNTED(fchown, SYS_fchown)
+COUNTED(fcntl, SYS_fcntl)
+COUNTED(fcntl64, SYS_fcntl)
+COUNTED(fdatasync, SYS_fdatasync)
+COUNTED(flock, SYS_flock)
+COUNTED(fstat, SYS_fstat)
+COUNTED(fstat64, SYS_fstat)
+COUNTED(fsync, SYS_fsync)
+COUNTED(ftruncate, SYS_ftruncate)
+COUNTED(ftruncate64, SYS_ftruncate)
+COUNTED(ioctl, SYS_ioctl)
+COUNTED(lseek, SYS_lseek)
+COUNTED(lseek64, SYS_lseek)
+COUNTED(pwrite, SYS_pwrite64)
+COUNTED(pwrite64, SYS_pwrite64)
+COUNTED(pwritev, SYS_pwritev)
+COUNTED(read, SYS_read)
+COUNTED(readv, SYS_readv)
+COUNTED(sync_file_range, SYS_sync_file_range)
 
 }  // extern "C"
 #pragma GCC visibility pop
@@ -117,6 +147,31 @@ TEST_P(WriteCallsTest, ARewriteDoesOneWriteCallALineAndNothingElseALine) {
     EXPECT_EQ(linesOfFile().size(), 1 + 2 * kind().linesOfRecord);
     EXPECT_EQ(othersOfChange(20), ofFew);
     EXPECT_EQ(linesOfFile().size(), 1 + 22 * kind().linesOfRecord);
+}
+
+TEST(WriteCallsWatchTest, SeesWhatIsDoneBesideWriting) {
+    const testsupport::TempDirectory directory;
+    const std::filesystem::path path = directory.path() / "file";
+    const int file = open(path.c_str(), O_RDWR | O_CREAT | O_CLOEXEC, 0600);
+    ASSERT_GE(file, 0);
+    const int other = open(path.c_str(), O_RDONLY | O_CLOEXEC);
+    struct stat status {};
+    char byte = 0;
+    const Watch watch(path);
+    EXPECT_EQ(write(file, "text", 4), 4);
+    EXPECT_EQ(lseek(file, 1, SEEK_SET), 1);
+    EXPECT_EQ(read(file, &byte, 1), 1);
+    EXPECT_EQ(fstat(file, &status), 0);
+    EXPECT_EQ(ftruncate(file, 2), 0);
+    EXPECT_EQ(pwrite(file, "T", 1, 0), 1);
+    EXPECT_GE(fcntl(file, F_GETFL), 0);
+    EXPECT_EQ(fdatasync(file), 0);
+    EXPECT_EQ(status.st_size, 4);
+    EXPECT_EQ(byte, 'e');
+    EXPECT_EQ(close(other), 0);
+    EXPECT_THAT(watch.written, testing::ElementsAre("text"));
+    EXPECT_EQ(watch.others, 8U);
+    EXPECT_EQ(close(file), 0);
 }
 
 }  // namespace
