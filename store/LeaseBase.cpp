@@ -62,6 +62,10 @@ std::ifstream& operator>>(std::ifstream& source, LeaseUnit& lease) {
     return source;
 }
 
+std::size_t bytesOfTexts(const LeaseUnit& lease) {
+    return bytesOfTexts(lease, LeaseStore::fields);
+}
+
 std::ofstream& operator<<(std::ofstream& target, const LeaseUnit& lease) {
     const Traced traced(at(LeaseStore::unit), label::target, &target, label::lease, &lease);
     writeRecord(target, lease, LeaseStore::fields);

@@ -2,6 +2,7 @@
 
 #include "RecordTrace.h"
 
+#include <cstddef>
 #include <fstream>
 #include <string>
 
@@ -34,6 +35,9 @@ struct LeaseUnit : private RecordTrace<LeaseStore> {
 
 /** Reads one record of a lease file from where the stream stands. A field that cannot be read keeps its value. */
 std::ifstream& operator>>(std::ifstream& source, LeaseUnit& lease);
+
+/** Bytes of memory that a copy of the record takes beside the record itself, for its texts. */
+std::size_t bytesOfTexts(const LeaseUnit& lease);
 
 /** Writes one record of a lease file: thirteen fields, one a line, each flushed. */
 std::ofstream& operator<<(std::ofstream& target, const LeaseUnit& lease);

@@ -41,6 +41,20 @@ void readRecord(std::istream& stream, Unit& unit, const Fields& fields) {
     }
 }
 
+/** Bytes of memory that a record's texts take, but for those short ones that stand in the record itself. */
+template <class Unit, class Fields>
+std::size_t bytesOfTexts(const Unit& unit, const Fields& fields) {
+    const std::size_t shortest = std::string().capacity();
+    std::size_t bytes = 0;
+    for (const auto& field : fields) {
+        const auto* text = std::get_if<std::string Unit::*>(&field.member);
+        if (text != nullptr && (unit.**text).size() > shortest) {
+            bytes += (unit.**text).size() + 1;
+        }
+    }
+    return bytes;
+}
+
 /** Writes the fields of a record, one a line, in the table's order. */
 template <class Unit, class Fields>
 void writeRecord(std::ostream& stream, const Unit& unit, const Fields& fields) {

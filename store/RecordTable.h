@@ -34,8 +34,8 @@ void openRecordFile(Stream& stream, const std::string& path, std::ios::openmode 
  * Reads a record file into an empty table.
  *
  * The count at the head is believed: a shorter file yields the declared number of records, a missing
- * field keeping the value of the record before. Only a count whose records the machine's memory cannot
- * hold, or that is no number, makes the file unreadable.
+ * field keeping the value of the record before. Only a count whose records, or whose copies of the last one, the
+ * machine's memory cannot hold, or that is no number, makes the file unreadable.
  *
  * @param count receives the number of records; left as it was, like the table, for an unreadable file
  * @throws std::bad_alloc when the process is refused the memory, std::ios_base::failure when the file cannot be read to
@@ -63,8 +63,17 @@ void loadRecords(const std::string& path, unsigned int& count, std::vector<Unit>
     }
     stream.exceptions(std::ios::badbit);
     Unit scratch;
+    bool isAtEnd = false;
     for (unsigned int record = 0; record < declared; ++record) {
         stream >> scratch;
+        if (!isAtEnd && !stream.good()) {  // from here on all are copies
+            isAtEnd = true;
+            if (!memoryCanHold(declared - record, sizeof(Unit) + bytesOfTexts(scratch))) {
+                std::vector<Unit>().swap(table);
+                table.reserve(reservedRecords);
+                return;
+            }
+        }
         table.push_back(scratch);
     }
     count = declared;

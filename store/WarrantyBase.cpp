@@ -53,6 +53,10 @@ std::ifstream& operator>>(std::ifstream& source, WarrantyUnit& warranty) {
     return source;
 }
 
+std::size_t bytesOfTexts(const WarrantyUnit& warranty) {
+    return bytesOfTexts(warranty, WarrantyStore::fields);
+}
+
 std::ofstream& operator<<(std::ofstream& target, const WarrantyUnit& warranty) {
     const Traced traced(at(WarrantyStore::unit), label::target, &target, label::warranty, &warranty);
     writeRecord(target, warranty, WarrantyStore::fields);

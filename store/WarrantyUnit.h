@@ -2,6 +2,7 @@
 
 #include "RecordTrace.h"
 
+#include <cstddef>
 #include <fstream>
 #include <string>
 
@@ -23,6 +24,9 @@ struct WarrantyUnit : private RecordTrace<WarrantyStore> {
 
 /** Reads one record of a warranty file from where the stream stands. A field that cannot be read keeps its value. */
 std::ifstream& operator>>(std::ifstream& source, WarrantyUnit& warranty);
+
+/** Bytes of memory that a copy of the record takes beside the record itself, for its texts. */
+std::size_t bytesOfTexts(const WarrantyUnit& warranty);
 
 /** Writes one record of a warranty file: four fields, one a line, each flushed. */
 std::ofstream& operator<<(std::ofstream& target, const WarrantyUnit& warranty);

@@ -3,6 +3,7 @@
 #include "Sides.h"
 
 #include <gmock/gmock.h>
+#include <unistd.h>
 
 #include <locale>
 #include <type_traits>
@@ -179,6 +180,24 @@ TYPED_TEST(Loading, OfACountThatMemoryCannotHoldGivesAnEmptyTable) {
         SCOPED_TRACE(count);
         this->expectEmpty(*this->load(count + std::string("\n") + this->record("A")));
     }
+}
+
+/** A file that ends within its first record, whose copies would fill the memory of the machine by their text alone. */
+TYPED_TEST(Loading, OfACountOfCopiesThatMemoryCannotHoldGivesAnEmptyTable) {
+    constexpr std::size_t length = 64U << 20U;
+    const auto memory =
+        static_cast<std::size_t>(sysconf(_SC_PHYS_PAGES)) * static_cast<std::size_t>(sysconf(_SC_PAGESIZE));
+    write(this->path(), std::to_string(memory / length + 1) + "\n" + std::string(length, 'x'));
+    typename TypeParam::Cache cache;
+    this->expectEmpty(cache);
+    EXPECT_EQ(cache.table.capacity(), 10U);
+}
+
+TYPED_TEST(Loading, OfACountOfCopiesThatMemoryCanHoldGivesThemAll) {
+    const std::string text(1U << 10U, 'x');
+    write(this->path(), "1000\n" + text);
+    typename TypeParam::Cache cache;
+    EXPECT_EQ(this->identifiers(cache), std::vector<std::string>(1000, text));
 }
 
 TYPED_TEST(Loading, OfADirectoryGivesAnEmptyTable) {
