@@ -122,6 +122,12 @@ TEST_F(RewriteFaultTest, MemoryThatIsRefusedFromThenOnKeepsTheFile) {
     }
 }
 
+TEST_F(RewriteFaultTest, AnOpeningThatFailsKeepsTheFile) {
+    for (const int error : {EMFILE, EACCES}) {
+        EXPECT_EQ(rewriteWith({operationOpen, 1, false, error}), leaseRecords(leases));
+    }
+}
+
 TEST_F(RewriteFaultTest, AClosingThatFailsHasWrittenTheFileWhole) {
     const std::string whole = wholeFile();
     for (const bool lasting : {false, true}) {
