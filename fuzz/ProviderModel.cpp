@@ -218,9 +218,18 @@ Expectation AssetSide::apply(const Call& call) {
     }
     Expectation expected{CMPI_RC_OK, 1};
     if (isAssetPath(call.path)) {
-        expected.shown.emplace_back();
+        expected.shown.push_back(call.action == Action::enumerateInstanceNames ? std::vector<std::string>() : shown());
     }
     return expected;
+}
+
+std::vector<std::string> AssetSide::shown() const {
+    std::vector<std::string> all;
+    for (const testsupport::AssetField& field : testsupport::assetFields) {
+        const auto value = values.find(field.key);
+        all.push_back(testsupport::shownValue(field, value == values.end() ? "" : value->second));
+    }
+    return all;
 }
 
 void AssetSide::requireAgreement() const {

@@ -70,6 +70,7 @@ public:
 
 private:
     void modify(const cimhost::Instance& instance);
+    std::vector<std::string> shown() const;
 
     bool exists = false;
     std::map<std::string, std::string> values{};  ///< by the file's key

@@ -1,6 +1,8 @@
 #include "support/AssetModel.h"
 
+#include "schema/MofWriter.h"
 #include "schema/Text.h"
+#include "support/Values.h"
 
 namespace testsupport {
 
@@ -31,6 +33,24 @@ const std::array<AssetField, 21> assetFields{{
 std::string AssetField::kept(const std::string& given) const {
     const bool isPointInTime = cimhost::isDateTime(given) && given[21] != ':' && given.find('*') == std::string::npos;
     return kind != AssetKind::date || isPointInTime ? given : std::string();
+}
+
+std::string shownValue(const AssetField& field, const std::string& kept) {
+    const std::string name = std::string(field.property) + "=";
+    if (field.kind == AssetKind::date) {
+        return name + (kept.empty() ? "NULL" : cimhost::formatMof(dateTime(kept)));
+    }
+    const bool isAbsent = field.kind == AssetKind::personalized && kept.empty();
+    return name + cimhost::formatMof(text(isAbsent ? "Null" : kept));
+}
+
+std::vector<std::string> shownAsset(const cimhost::Instance& instance) {
+    std::vector<std::string> values;
+    for (const AssetField& field : assetFields) {
+        const cimhost::Value* value = find(instance.properties, field.property);
+        values.push_back(std::string(field.property) + "=" + (value == nullptr ? "" : cimhost::formatMof(*value)));
+    }
+    return values;
 }
 
 }  // namespace testsupport

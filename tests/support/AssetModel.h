@@ -2,6 +2,9 @@
 
 #include <array>
 #include <string>
+#include <vector>
+
+#include "model/Value.h"
 
 // The rules of the asset file, written down a second time and independently of the provider.
 
@@ -27,6 +30,12 @@ struct AssetField {
     /** What is kept of a value that a client gives. */
     std::string kept(const std::string& given) const;
 };
+
+/** What an instance shows of a value that the file holds, "" without one: "Name=value" as MOF. */
+std::string shownValue(const AssetField& field, const std::string& kept);
+
+/** The same of a real instance, in the order of assetFields. */
+std::vector<std::string> shownAsset(const cimhost::Instance& instance);
 
 /** All that the asset file holds; those that repeat one another in their order. */
 extern const std::array<AssetField, 21> assetFields;
