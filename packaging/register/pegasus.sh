@@ -16,7 +16,7 @@ pegasus_server() {
         }
     done
     pegasus_modules >/dev/null || {
-        failed "OpenPegasus: its server does not answer, and nothing can be registered without it: start cimserver"
+        failed "OpenPegasus: its server does not answer, and is needed: start cimserver"
         return 1
     }
 }
@@ -60,7 +60,7 @@ pegasus_find_other_computers() {
     others=yes
     if has_computers || pegasus_modules | grep -qx "$(modules_in "$data/pegasus/$computers.mof")"; then
         others=no
-    elif has cimcli && served=$(pegasus_served) && ! printf '%s\n' "$served" | grep -qx "$(classes_of "$computers")"; then
+    elif has cimcli && served=$(pegasus_served) && ! printf '%s\n' "$served" | grep -qix "$(classes_of "$computers")"; then
         others=no
     fi
 }

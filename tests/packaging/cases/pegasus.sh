@@ -253,19 +253,20 @@ ends_with 0
 module LeaseAndWarranty LeaseAndWarrantyGate
 
 begin "OpenPegasus: a command that does not end is ended"
-machine "${pegasus[@]}"
+machine "${pegasus[@]}" timeout
 touch "$STAND_IN/hang/cimprovider"
 for command in register unregister list; do
-    register --time-limit 0.1 $command
+    register $command
     ends_with 1
     says "its server does not answer"
 done
 rm "$STAND_IN/hang/cimprovider"
 register register --provider bare
 touch "$STAND_IN/hang/cimmof"
-register --time-limit 0.1 register --provider gate
+register register --provider gate
 ends_with 1
-says "did not end within 0.1 seconds: cimmof"
+called 'timeout -k 10 120 cimmof .*'
+says "did not end within 120 seconds: cimmof"
 module LeaseAndWarranty LeaseAndWarrantyProvider
 
 begin "OpenPegasus: a provider directory that does not name the library's is a warning"
