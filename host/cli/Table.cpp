@@ -1,6 +1,9 @@
 #include "cli/Table.h"
 
 #include <algorithm>
+#include <string_view>
+
+#include "cli/Width.h"
 
 namespace cimhost::text {
 namespace {
@@ -8,24 +11,18 @@ namespace {
 constexpr std::size_t gap = 2;              ///< blanks between columns
 constexpr std::size_t leastLastWidth = 16;  ///< less is no room for the last column
 
-bool beginsCharacter(char byte) {
-    return (static_cast<unsigned char>(byte) & 0xC0U) != 0x80U;  // the others go on with a character of UTF-8
-}
-
-std::size_t widthOf(const std::string& text) {
-    return static_cast<std::size_t>(std::count_if(text.begin(), text.end(), beginsCharacter));
-}
-
 /** Where the part of a text ends that begins at a place and has room: behind its last blank, if it has one. */
 std::size_t endOfPart(const std::string& text, std::size_t begin, std::size_t room) {
     std::size_t afterBlank = begin;
     std::size_t width = 0;
-    for (std::size_t at = begin; at < text.size(); ++at) {
-        width += beginsCharacter(text[at]) ? 1U : 0U;
-        if (width > room) {
+    for (std::size_t at = begin; at < text.size();) {
+        const Character next = firstCharacter(std::string_view(text).substr(at));
+        width += next.columns;
+        if (width > room && at > begin) {
             return afterBlank > begin ? afterBlank : at;
         }
-        afterBlank = text[at] == ' ' ? at + 1 : afterBlank;
+        at += next.bytes;
+        afterBlank = text[at - 1] == ' ' ? at : afterBlank;
     }
     return text.size();
 }
@@ -51,7 +48,7 @@ public:
         for (const Row& row : rows) {
             widths.resize(std::max(widths.size(), row.size()));
             for (std::size_t i = 0; i < row.size(); ++i) {
-                widths[i] = std::max(widths[i], widthOf(row[i]));
+                widths[i] = std::max(widths[i], columnsOf(row[i]));
             }
         }
         if (!widths.empty()) {
@@ -74,7 +71,7 @@ private:
     std::string sideBySide(const Row& row) const {
         std::string line = indent;
         for (std::size_t i = 0; i + 1 < row.size(); ++i) {
-            line += cell(row, i, row[i]) + std::string(widths[i] - widthOf(row[i]) + gap, ' ');
+            line += cell(row, i, row[i]) + std::string(widths[i] - columnsOf(row[i]) + gap, ' ');
         }
         const bool hasLast = row.size() == widths.size() + 1;
         return line + below(row, row.size() - 1, hasLast ? lastBegins : 0);

@@ -57,9 +57,12 @@ int runGuarded(const Arguments& arguments) {
     } catch (const LoadError& error) {
         complain(error.what());
         return exitLoad;
-    } catch (const LibraryError& error) {
+    } catch (const LibraryNotFound& error) {
         complain(std::string(error.what()) +
                  " (libraries are looked for with --library-path and CIMHOST_LIBRARY_PATH)");
+        return exitLoad;
+    } catch (const LibraryError& error) {
+        complain(error.what());
         return exitLoad;
     } catch (const UsageError& error) {
         complain(error.what());

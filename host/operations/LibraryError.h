@@ -10,4 +10,10 @@ public:
     using std::runtime_error::runtime_error;
 };
 
+/** A library that is nowhere where it was looked for. */
+class LibraryNotFound : public LibraryError {
+public:
+    using LibraryError::LibraryError;
+};
+
 }  // namespace cimhost

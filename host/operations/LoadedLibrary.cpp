@@ -27,7 +27,7 @@ std::filesystem::path findLibrary(const std::string& location, const LibraryOpti
         folders += (folders.empty() ? "" : ", ") + folder.string();
     }
     if (!folders.empty()) {
-        throw LibraryError(name + " is in none of these folders: " + folders);
+        throw LibraryNotFound(name + " is in none of these folders: " + folders);
     }
     return name;
 }
@@ -35,7 +35,11 @@ std::filesystem::path findLibrary(const std::string& location, const LibraryOpti
 LoadedLibrary::LoadedLibrary(std::filesystem::path itsFile, int flags)
     : libraryFile(std::move(itsFile)), handle(dlopen(libraryFile.c_str(), flags)) {
     if (handle == nullptr) {
-        throw LibraryError("Cannot load " + libraryFile.string() + ": " + reason());
+        const std::string text = "Cannot load " + libraryFile.string() + ": " + reason();
+        if (libraryFile.has_parent_path()) {
+            throw LibraryError(text);
+        }
+        throw LibraryNotFound(text);
     }
 }
 

@@ -2,12 +2,23 @@
 
 #include <cmath>
 #include <limits>
+#include <sstream>
+#include <string>
+#include <variant>
 
 #include "host/schema/Schemas.h"
 #include "schema/Literal.h"
 
 namespace cimhost::test {
 namespace {
+
+/** The instance of a class whose one property has a text. */
+Instance instanceWith(const std::string& text) {
+    Instance instance;
+    instance.path.className = "C";
+    instance.properties.push_back({"A", singleValue(CMPI_string, text)});
+    return instance;
+}
 
 TEST(MofWriter, WritesEachKindOfValueAsAConstant) {
     EXPECT_EQ(formatMof(singleValue(CMPI_boolean, true)), "TRUE");
@@ -44,11 +55,34 @@ TEST(MofWriter, AnInstanceIsWrittenInUtf8WhateverItsTextsAre) {
         {"z\xF0\x9F\x98", "z\uFFFD"},
     };
     for (const Case& each : cases) {
-        Instance instance;
-        instance.path.className = "C";
-        instance.properties.push_back({"A", singleValue(CMPI_string, each.text)});
-        EXPECT_EQ(formatMof(instance), "instance of C {\n    A = \"" + each.written + "\";\n};\n");
+        EXPECT_EQ(formatMof(instanceWith(each.text)), "instance of C {\n    A = \"" + each.written + "\";\n};\n");
     }
+}
+
+TEST(MofWriter, NoLiteralIsLongerThanCompilersHaveRoomForAndTheTextIsReadBack) {
+    std::string text;
+    for (int number = 0; number < 1500; ++number) {
+        text += number % 3 == 0 ? "\xE2\x82\xAC" : number % 3 == 1 ? "\x01" : "\"x";
+    }
+    const std::string written = formatMof(instanceWith(text));
+    std::istringstream lines(written);
+    std::size_t literals = 0;
+    for (std::string line; std::getline(lines, line);) {
+        const std::size_t begin = line.find('"');
+        literals += begin != std::string::npos ? 1 : 0;
+        EXPECT_TRUE(begin == std::string::npos || line.rfind('"') - begin - 1 <= 1023) << line;
+    }
+    EXPECT_GT(literals, 5U);
+    Schema schema;
+    MofReader(schema).readText("class C { string A; }; " + written, "long text");
+    EXPECT_EQ(std::get<std::string>(schema.instances().front().properties.front().value.elements.front()), text);
+}
+
+TEST(MofWriter, AShortTextIsOneLiteral) {
+    const std::string text(1000, 'x');
+    EXPECT_EQ(formatMof(instanceWith(text)), "instance of C {\n    A = \"" + text + "\";\n};\n");
+    EXPECT_EQ(formatMof(instanceWith("")), "instance of C {\n    A = \"\";\n};\n");
+    EXPECT_EQ(formatMof(instanceWith(text + "y")), "instance of C {\n    A = \"" + text + "\"\n        \"y\";\n};\n");
 }
 
 TEST(MofWriter, AControlCharacterBeforeAHexadecimalDigitIsReadBack) {
