@@ -15,8 +15,8 @@
 namespace bench {
 
 /**
- * One thing that is measured of the provider and of the floor alike. Registered as two benchmarks, with names of the
- * form Operation[.detail]/Class/provider/size and .../floor/size.
+ * One thing that is measured of the provider and of the floor alike. Registered as three benchmarks, with names of the
+ * form Operation[.detail]/Class/provider/size, .../floor/size and .../both/size, which asks the two in turn.
  */
 struct Case {
     std::string operation;

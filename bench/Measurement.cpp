@@ -5,13 +5,15 @@
 #include <malloc.h>
 
 #include <algorithm>
+#include <cstddef>
 #include <exception>
 #include <fstream>
 #include <functional>
 #include <iterator>
-#include <limits>
 #include <optional>
 #include <stdexcept>
+#include <utility>
+#include <vector>
 
 namespace bench {
 
@@ -23,6 +25,14 @@ std::string fileText(const std::filesystem::path& file) {
         throw std::runtime_error("there is no " + file.string());
     }
     return {std::istreambuf_iterator<char>(stream), {}};
+}
+
+/** @throws std::runtime_error unless a change by the provider left what the floor's left */
+void requireSameFile(const Workbench& bench, const Case& one) {
+    if (!one.changedFile.empty() &&
+        fileText(bench.agent().data() / one.changedFile) != fileText(bench.agent().floorData() / one.changedFile)) {
+        throw std::runtime_error("the record file is not what it should be after the change");
+    }
 }
 
 /** Performs a request once an iteration. @param interfaces gives what answers it @return the last outcome */
@@ -55,10 +65,7 @@ void measureProvider(benchmark::State& state, Workbench& bench, const Case& one)
     askFloor();  // the memory for the answer is now in the process, and no side pays for getting it
     const Outcome outcome = measure(state, bench, one.request, [&] { return one.provider(bench); });
     requireSame(outcome.events, askFloor().events);
-    if (!one.changedFile.empty() &&
-        fileText(bench.agent().data() / one.changedFile) != fileText(bench.agent().floorData() / one.changedFile)) {
-        throw std::runtime_error("the record file is not what it should be after the change");
-    }
+    requireSameFile(bench, one);
 }
 
 /** The time of a request. @throws std::runtime_error unless the answer is the expected one */
@@ -69,34 +76,73 @@ double secondsOf(Workbench& bench, const Request& request, const Interfaces& int
     return outcome.seconds;
 }
 
-/** The clock of a virtual machine may stand still over a short request: no time is no measurement. */
-void keepBest(double& best, double seconds) {
-    best = seconds > 0 ? std::min(best, seconds) : best;
+/** The middle of some times: neither what disturbs some of them nor a clock that goes in leaps counts. */
+double middle(std::vector<double> seconds) {
+    const auto half = seconds.begin() + static_cast<std::ptrdiff_t>(seconds.size() / 2);
+    std::nth_element(seconds.begin(), half, seconds.end());
+    if (*half <= 0) {
+        throw std::runtime_error("the clock stands still");
+    }
+    return *half;
 }
 
-/**
- * Performs a request on the provider alone and behind the gate in turn, so that what else the machine does falls on
- * both. The best time of each, in seconds, is told beside the mean.
- */
-void measureGate(benchmark::State& state, Workbench& bench, const Case& one) {
-    constexpr int turns = 10;  // in an iteration, of which there may be few
-    const auto [alone, gated] = one.twice(bench);
-    const std::unique_ptr<Floor> floor = one.floor(bench, bench.broker().handle());
-    const Outcome expected = perform(bench.broker(), one.request, floor->interfaces());
-    double bestAlone = std::numeric_limits<double>::max();
-    double bestGated = bestAlone;
+/** Times two sides in turn, so that what else the machine does falls on both. The middle time of each is told. */
+void measureInTurn(benchmark::State& state, int turns, const char* firstName, const std::function<double()>& first,
+                   const char* secondName, const std::function<double()>& second) {
+    std::vector<double> firstTimes;
+    std::vector<double> secondTimes;
     for (auto _ : state) {
         double seconds = 0;
         for (int turn = 0; turn < turns; ++turn) {
-            keepBest(bestAlone, secondsOf(bench, one.request, alone, expected));
-            const double latest = secondsOf(bench, one.request, gated, expected);
-            keepBest(bestGated, latest);
-            seconds += latest / turns;
+            firstTimes.push_back(first());
+            secondTimes.push_back(second());
+            seconds += (firstTimes.back() + secondTimes.back()) / turns;
         }
         state.SetIterationTime(seconds);
     }
-    state.counters["alone"] = bestAlone;
-    state.counters["gated"] = bestGated;
+    state.counters[firstName] = middle(std::move(firstTimes));
+    state.counters[secondName] = middle(std::move(secondTimes));
+}
+
+/** How often each side has its turn in an iteration, of which there may be one only. */
+int turnsFor(const Case& one) {
+    return one.size < largestSize ? 10 : 3;
+}
+
+void measureBoth(benchmark::State& state, Workbench& bench, const Case& one) {
+    std::unique_ptr<Floor> floor;
+    const auto askFloor = [&] {
+        if (floor == nullptr || !one.changedFile.empty()) {
+            floor = one.floor(bench, bench.broker().handle());
+        }
+        return perform(bench.broker(), one.request, floor->interfaces());
+    };
+    Outcome latest;
+    const auto timeFloor = [&] {
+        latest = {};  // both sides find the same memory in the process, and free
+        const Outcome outcome = askFloor();
+        requireAnswered(one.request, outcome);
+        return outcome.seconds;
+    };
+    const auto timeProvider = [&] {
+        latest = perform(bench.broker(), one.request, one.provider(bench));
+        requireAnswered(one.request, latest);
+        return latest.seconds;
+    };
+    timeFloor();
+    measureInTurn(state, turnsFor(one), "floor", timeFloor, "provider", timeProvider);
+    requireSame(latest.events, askFloor().events);
+    requireSameFile(bench, one);
+}
+
+/** The provider alone and behind the gate. */
+void measureGate(benchmark::State& state, Workbench& bench, const Case& one) {
+    const auto sides = one.twice(bench);
+    const std::unique_ptr<Floor> floor = one.floor(bench, bench.broker().handle());
+    const Outcome expected = perform(bench.broker(), one.request, floor->interfaces());
+    const auto time = [&](const Interfaces& side) { return secondsOf(bench, one.request, side, expected); };
+    measureInTurn(
+        state, turnsFor(one), "alone", [&] { return time(sides.first); }, "gated", [&] { return time(sides.second); });
 }
 
 /** Registers a benchmark that measures its own time; what it throws makes it fail. */
@@ -185,6 +231,7 @@ void registerCase(const Case& one, Workbench& workbench, bool& failed) {
         registerSide("/gate/", &measureGate);
     }
     registerSide("/floor/", &measureFloor);
+    registerSide("/both/", &measureBoth);
 }
 
 void registerLoading(Workbench& workbench, bool& failed) {
