@@ -79,8 +79,10 @@ pegasus_load_classes() {
         others=yes
         pegasus_declare_computers
     fi
-    # shellcheck disable=SC2046 # one word a file: installation directories have no blanks
-    run cimmof -uc -n "$namespace" $(our_classes | sed "s|.*|$data/&.mof|")
+    # One call a file: of several, cimmof tells only how the last one went.
+    for class in $(our_classes); do
+        run cimmof -uc -n "$namespace" "$data/$class.mof" || return 1
+    done
 }
 
 # Associations refer to computers. A class that another agent may have declared is declared where there is none, and not
