@@ -31,11 +31,17 @@ pegasus_modules() {
     done
 }
 
-# Module and provider of what is registered of ours.
+# Module and provider of what is registered of ours. Where that cannot be known it fails: there may be something.
 pegasus_registered() {
-    for module in $(pegasus_modules); do
-        limited cimprovider -l -m "$module" | sed "s/^/$module /"
+    found=$(pegasus_modules) || return 1
+    for module in $found; do
+        names=$(limited cimprovider -l -m "$module" 2>/dev/null) || return 1
+        [ -z "$names" ] || printf '%s\n' "$names" | sed "s/^/$module /"
     done
+}
+
+pegasus_unknown() {
+    failed "OpenPegasus: its server does not tell what is registered"
 }
 
 # Its builds keep registrations in namespaces of different names. That is looked for by asking: cimmof would make a
@@ -141,7 +147,10 @@ pegasus_look_for_library() {
 # A signal is not heeded before the new registration has taken the old one's place.
 register_pegasus() {
     pegasus_server && pegasus_find_interop || return
-    before=$(pegasus_registered)
+    before=$(pegasus_registered) || {
+        pegasus_unknown
+        return
+    }
     choose_library "$before" || {
         say "OpenPegasus: nothing was registered, and nothing is renewed"
         return
@@ -184,14 +193,18 @@ unregister_pegasus() {
 }
 
 pegasus_registered_classes() {
-    pegasus_modules >/dev/null || return 1
-    pegasus_registered | while read -r module name; do
+    lines=$(pegasus_registered) || return 1
+    [ -z "$lines" ] || printf '%s\n' "$lines" | while read -r module name; do
         classes_of "$name"
     done
 }
 
 list_pegasus() {
     pegasus_server || return
-    lines=$(pegasus_registered | sed 's/^\([^ ]*\) /OpenPegasus: module \1, provider /')
+    lines=$(pegasus_registered) || {
+        pegasus_unknown
+        return
+    }
+    lines=$(printf '%s\n' "$lines" | sed 's/^\([^ ]*\) /OpenPegasus: module \1, provider /')
     echo "${lines:-OpenPegasus: nothing is registered}"
 }

@@ -152,6 +152,27 @@ for option in --restart --only-registered; do
     module LeaseAndWarranty LeaseAndWarrantyProvider
 done
 
+begin "OpenPegasus: where it is not told what is registered, nothing is changed, and that is said"
+machine "${pegasus[@]}"
+register register --provider bare
+for calls in 1 2 3; do # of those that list: the first ask for the modules, the others for the provider of each
+    for option in "" --only-registered; do
+        echo $calls >"$STAND_IN/fail/cimprovider"
+        # shellcheck disable=SC2086 # none or one word
+        register register $option
+        ends_with 1
+        says "OpenPegasus: its server does not tell what is registered"
+        called_nothing_like '^cimmof|^cimprovider -r'
+        module LeaseAndWarranty LeaseAndWarrantyProvider
+    done
+    echo $calls >"$STAND_IN/fail/cimprovider"
+    register list
+    ends_with 1
+    says "OpenPegasus: its server does not tell what is registered"
+    says_nothing_of "nothing is registered"
+done
+rm "$STAND_IN/fail/cimprovider"
+
 begin "OpenPegasus: computers that another agent's provider serves are left to it"
 machine "${pegasus[@]}"
 rm "$work/prefix/lib/libOstrelComputerSystemProvider.so"

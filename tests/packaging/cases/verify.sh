@@ -44,6 +44,11 @@ for manager in sfcb pegasus; do
     says "VELKO_Lease: served, 0 instances"
     says "VELKO_WarrantySetting: served, 0 instances"
 done
+echo 1 >"$STAND_IN/fail/cimprovider"
+register verify
+ends_with 0
+says "VELKO_Lease: no instances; served or not"
+rm "$STAND_IN/fail/cimprovider"
 touch "$STAND_IN/stopped"
 register verify
 ends_with 0
