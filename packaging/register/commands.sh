@@ -14,15 +14,22 @@ limited() {
     fi
 }
 
-# Runs a command that changes something, and shows it.
+# Runs a command that changes something, and shows it. What it says is taken here and passed on when it has ended: a
+# command that wrote to where nobody reads would end in the middle of its work, or fail.
 run() {
     if [ "$dry_run" = yes ]; then
         printf 'would run: %s\n' "$*"
         return 0
     fi
-    printf 'running: %s\n' "$*"
-    limited "$@" 9>&- && return 0
-    complain "$(what_ended $?): $*"
+    show "running: $*"
+    ended=0
+    told=$(limited "$@" 2>&1 9>&-) || ended=$?
+    if [ "$ended" -eq 0 ]; then
+        [ -z "$told" ] || show "$told"
+        return 0
+    fi
+    [ -z "$told" ] || show "$told" >&2
+    complain "$(what_ended "$ended"): $*"
     return 1
 }
 
@@ -51,7 +58,7 @@ on_signal() { # ACTION
     trap "$1" HUP INT QUIT TERM
 }
 
-# Who listens no more does not end the work. First the one stream may be gone, then the other.
+# Who listens no more does not end the work, neither here nor in the commands, which ignore that signal too then.
 go_on_unheard() {
-    trap 'exec >/dev/null; trap "exec 2>/dev/null" PIPE' PIPE
+    trap '' PIPE
 }

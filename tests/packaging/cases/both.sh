@@ -70,6 +70,46 @@ ln -sf /nowhere/lock "$LEASE_WARRANTY_LOCK"
 register register
 ends_with 0
 
+begin "Who listens no more does not end the work, neither here nor in the commands that say something"
+for streams in output both; do
+    machine "${sfcb[@]}" "${pegasus[@]}"
+    register register --provider bare
+    touch "$STAND_IN/talkative"
+    for command in "register --provider gate" unregister; do
+        exec 3> >(exit 0)
+        wait $!
+        if [ $streams = both ]; then exec 4>&3; else exec 4>"$work/output"; fi
+        status=0
+        # shellcheck disable=SC2086 # several words
+        command_itself $command >&3 2>&4 || status=$?
+        exec 3>&- 4>&-
+        [ $streams = output ] || echo "is heard by nobody" >"$work/output"
+        ends_with 0
+        says_nothing_of "error"
+        provider_register 0 LeaseAndWarrantyProvider
+        if [ "$command" = unregister ]; then
+            provider_register 0 LeaseAndWarrantyGate
+            [ -z "$(ls "$STAND_IN/modules")" ] || complain "a module is still registered"
+        else
+            provider_register 6 LeaseAndWarrantyGate
+            module LeaseAndWarranty LeaseAndWarrantyGate
+        fi
+        [ -z "$(find "$STAND_IN/sfcb" -name 'before-*')" ] || complain "copies are left"
+    done
+done
+
+begin "What the commands say is passed on: what failed, on the error output"
+machine "${sfcb[@]}"
+touch "$STAND_IN/talkative"
+command_itself register >"$work/output" 2>"$work/errors" || complain "fails"
+says "sfcbstage: going on"
+says "sfcbrepos: warning"
+echo broken >"$work/prefix/$data/VELKO_Lease.mof"
+if command_itself register >"$work/output" 2>"$work/errors"; then complain "does not fail"; fi
+cp "$work/errors" "$work/output"
+says "Failed compiling the MOF files."
+says_nothing_of "sfcbstage: going on"
+
 begin "Wrong usage is told, and nothing is done"
 for arguments in "" "frobnicate" "register list" "--provider best register" "--provider" "--manager owner list" "--time-limit soon list"; do
     # shellcheck disable=SC2086 # several words

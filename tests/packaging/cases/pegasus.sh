@@ -268,17 +268,6 @@ for signal in TERM INT HUP QUIT; do
     [ -z "$(find "$STAND_IN/modules" "$STAND_IN/classes" -type f)" ] || complain "something is still registered"
 done
 
-begin "OpenPegasus: who listens no more does not end the work"
-machine "${pegasus[@]}"
-register register --provider bare
-exec 3> >(exit 0)
-wait $!
-status=0
-command_itself register --provider gate >&3 2>"$work/output" || status=$?
-exec 3>&-
-ends_with 0
-module LeaseAndWarranty LeaseAndWarrantyGate
-
 begin "OpenPegasus: a command that does not end is ended"
 machine "${pegasus[@]}" timeout
 touch "$STAND_IN/hang/cimprovider"

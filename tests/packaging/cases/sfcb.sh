@@ -156,26 +156,6 @@ ends_with 0
 provider_register 6 LeaseAndWarrantyGate
 [ -z "$(find "$STAND_IN/sfcb" -name 'before-*')" ] || complain "copies are left"
 
-begin "SFCB: who listens no more does not end the work"
-machine "${sfcb[@]}"
-register register --provider bare
-for streams in one both; do
-    exec 3> >(exit 0)
-    wait $!
-    status=0
-    if [ $streams = one ]; then
-        command_itself register --provider gate >&3 2>"$work/output" || status=$?
-    else
-        : >"$work/output"
-        command_itself unregister >&3 2>&3 || status=$?
-    fi
-    exec 3>&-
-    ends_with 0
-    if [ $streams = one ]; then provider_register 6 LeaseAndWarrantyGate; else provider_register 0 LeaseAndWarrantyGate; fi
-    provider_register 0 LeaseAndWarrantyProvider
-    [ -z "$(find "$STAND_IN/sfcb" -name 'before-*')" ] || complain "copies are left"
-done
-
 begin "SFCB: a command that does not end is ended, and all is as it was"
 machine "${sfcb[@]}" timeout
 register register --provider bare
