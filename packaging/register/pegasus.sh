@@ -5,9 +5,9 @@ find_pegasus() {
     has cimprovider || has cimmof || has cimserver
 }
 
-# OpenPegasus takes registrations back through its server only, and keeps old ones where new ones are given. Its cimmofl,
-# which writes into the repository of a stopped server, is not used: what is registered cannot be seen then, so an old
-# registration would stay, and a server that does not answer may yet run, and write there too.
+# OpenPegasus takes registrations back through its server only, and keeps old ones where new ones are given. Its
+# cimmofl, which writes into the repository of a stopped server, is not used: what is registered cannot be seen then, so
+# an old registration would stay, and a server that does not answer may yet run, and write there too.
 pegasus_server() {
     for tool in cimmof cimprovider; do
         has "$tool" || {
@@ -66,7 +66,8 @@ pegasus_find_other_computers() {
     others=yes
     if has_computers || pegasus_modules | grep -qx "$(modules_in "$data/pegasus/$computers.mof")"; then
         others=no
-    elif has cimcli && served=$(pegasus_served) && ! printf '%s\n' "$served" | grep -qix "$(classes_of "$computers")"; then
+    elif has cimcli && served=$(pegasus_served) &&
+        ! printf '%s\n' "$served" | grep -qix "$(classes_of "$computers")"; then
         others=no
     fi
 }
@@ -98,7 +99,8 @@ pegasus_declare_computers() {
         if has cimcli && pegasus_has_class "$namespace" "$class"; then
             continue
         fi
-        run cimmof -n "$namespace" "$data/$class.mof" || complain "OpenPegasus: going on: $class may be declared already"
+        run cimmof -n "$namespace" "$data/$class.mof" ||
+            complain "OpenPegasus: going on: $class may be declared already"
     done
 }
 
@@ -122,13 +124,17 @@ pegasus_replace() { # FORMER: module and provider, a line each
     return 1
 }
 
+pegasus_new_name() { # PROVIDER
+    if [ "$1" = "$former_computers" ]; then echo "$computers"; else echo "$1"; fi
+}
+
 # What cannot be removed is not registered over.
 pegasus_put_back() { # FORMER
     pegasus_remove_modules
     left=$(pegasus_modules) || return
     printf '%s\n' "$1" | while read -r module name; do
         if ! printf '%s\n' "$left" | grep -qx "$module"; then
-            [ "$name" != "$former_computers" ] || name=$computers
+            name=$(pegasus_new_name "$name")
             complain "OpenPegasus: trying to register $name again"
             pegasus_load_provider "$name"
         fi
@@ -195,7 +201,7 @@ unregister_pegasus() {
 pegasus_registered_classes() {
     lines=$(pegasus_registered) || return 1
     [ -z "$lines" ] || printf '%s\n' "$lines" | while read -r module name; do
-        classes_of "$name"
+        classes_of "$(pegasus_new_name "$name")"
     done
 }
 

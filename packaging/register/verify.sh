@@ -49,15 +49,26 @@ is_error() {
     printf '%s\n' "$1" | grep -q '^\* wbemcli: '
 }
 
-# Prints the classes that are registered here, if that can be known.
+# Prints the classes that are registered here, if that can be known. Where both managers are installed, it is not known
+# which of them answers: it can be said of what is registered with both alike.
 registered_classes() {
     case $server in
     localhost | localhost:* | 127.* | '[::1]'*) ;;
     *) return 1 ;;
     esac
-    [ "$sfcb$pegasus" != nono ] || return 1
-    [ "$sfcb" = no ] || sfcb_registered_classes || return 1
-    [ "$pegasus" = no ] || pegasus_registered_classes
+    with_sfcb='' with_pegasus=''
+    [ "$sfcb" = no ] || with_sfcb=$(sfcb_registered_classes) || return 1
+    [ "$pegasus" = no ] || with_pegasus=$(pegasus_registered_classes) || return 1
+    case $sfcb$pegasus in
+    yesno) echo "$with_sfcb" ;;
+    noyes) echo "$with_pegasus" ;;
+    yesyes) same_words "$with_sfcb" "$with_pegasus" && echo "$with_sfcb" ;;
+    *) return 1 ;;
+    esac
+}
+
+same_words() { # LINES LINES
+    [ "$(printf '%s\n' "$1" | sort -u)" = "$(printf '%s\n' "$2" | sort -u)" ]
 }
 
 has_word() { # WORDS WORD
@@ -68,7 +79,7 @@ verify_class() { # CLASS
     answer=$(ask "$1")
     ended=$?
     if [ $ended -ne 0 ] || is_error "$answer"; then
-        [ $ended -ne 124 ] || answer="${answer:+$answer }$(what_ended $ended): $client"
+        case $ended in 124 | 137) answer="${answer:+$answer }$(what_ended $ended): $client" ;; esac
         printf '%s\n' "$answer" | sed "s/^/$1: /" >&2
         failed "$1 is not served"
         return

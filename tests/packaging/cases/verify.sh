@@ -44,6 +44,11 @@ for manager in sfcb pegasus; do
     says "VELKO_Lease: served, 0 instances"
     says "VELKO_WarrantySetting: served, 0 instances"
 done
+echo ComputerSystemProvider >"$STAND_IN/modules/OstrelComputerSystem" # as an earlier version has registered it
+register verify
+ends_with 0
+says "VELKO_Lease: served, 0 instances"
+says_nothing_of "sed:"
 echo 1 >"$STAND_IN/fail/cimprovider"
 register verify
 ends_with 0
@@ -53,6 +58,27 @@ touch "$STAND_IN/stopped"
 register verify
 ends_with 0
 says "VELKO_Lease: no instances; served or not"
+
+begin "With both managers, an empty answer is one where the class is registered with both, or with that which is named"
+machine "${sfcb[@]}" "${pegasus[@]}" wbemcli
+printf '%s\n' VELKO_Lease VELKO_LeaseSetting >"$STAND_IN/empty"
+register verify
+ends_with 1
+says "VELKO_Lease is not served"
+register --manager sfcb register
+register verify
+ends_with 0
+says "VELKO_Lease: no instances; served or not"
+register verify --manager sfcb
+ends_with 0
+says "VELKO_Lease: served, 0 instances"
+register verify --manager pegasus
+ends_with 1
+says "VELKO_Lease is not served"
+register register
+register verify
+ends_with 0
+says "VELKO_Lease: served, 0 instances"
 
 begin "Nothing is known of what is registered on another machine, which needs no object manager here"
 machine wbemcli
@@ -77,6 +103,14 @@ touch "$STAND_IN/hang/wbemcli"
 register verify --time-limit 0.1
 ends_with 1
 says "VELKO_Lease: this command did not end within 0.1 seconds: wbemcli"
+says "VELKO_Lease is not served"
+
+begin "A client that ignores that it is to end is ended too, and the same is said"
+machine "${sfcb[@]}" wbemcli timeout
+echo TERM >"$STAND_IN/hang/wbemcli"
+register verify
+ends_with 1
+says "this command did not end within 120 seconds: wbemcli"
 says "VELKO_Lease is not served"
 
 begin "A place without a scheme is one of http"
