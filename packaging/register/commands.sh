@@ -40,7 +40,8 @@ what_ended() { # STATUS
     esac
 }
 
-# Two runs at a time would take each other's changes for their own. Who may not write the lock may not register either.
+# Two runs at a time would take each other's changes for their own. Who may not write the lock mostly may not register
+# either; who may, with directories of his own, names another lock or sees to it himself.
 lock() {
     [ "$dry_run" = no ] && has flock && (umask 077 && : >>"$lock_file") 2>/dev/null || return 0
     exec 9>>"$lock_file"

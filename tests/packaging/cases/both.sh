@@ -111,7 +111,8 @@ says "Failed compiling the MOF files."
 says_nothing_of "sfcbstage: going on"
 
 begin "Wrong usage is told, and nothing is done"
-for arguments in "" "frobnicate" "register list" "--provider best register" "--provider" "--manager owner list" "--time-limit soon list"; do
+for arguments in "" "frobnicate" "register list" "--provider best register" "--provider" "--manager owner list" \
+    "--time-limit soon list" "--time-limit 0 list" "--time-limit 0.0 list"; do
     # shellcheck disable=SC2086 # several words
     register $arguments
     ends_with 2
