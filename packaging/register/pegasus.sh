@@ -107,7 +107,7 @@ pegasus_declare_computers() {
 pegasus_remove_modules() {
     former_modules=$(pegasus_modules) || return 1
     for module in $former_modules; do
-        run cimprovider -r -m "$module" || return 1
+        [ "$module" = "$stays" ] || run cimprovider -r -m "$module" || return 1
     done
 }
 
@@ -150,6 +150,11 @@ pegasus_look_for_library() {
     esac
 }
 
+# The module of computers by their former name, where the agent has them by that.
+pegasus_former_computers() { # FORMER
+    ! has_former_computers || printf '%s\n' "$1" | sed -n "s/ $former_computers\$//p"
+}
+
 # A signal is not heeded before the new registration has taken the old one's place.
 register_pegasus() {
     pegasus_server && pegasus_find_interop || return
@@ -161,6 +166,7 @@ register_pegasus() {
         say "OpenPegasus: nothing was registered, and nothing is renewed"
         return
     }
+    stays=$(pegasus_former_computers "$before")
     on_signal ''
     if pegasus_replace "$before"; then
         registered_with=$registered_with,pegasus
@@ -187,6 +193,7 @@ pegasus_delete_classes() {
 
 unregister_pegasus() {
     pegasus_server || return
+    stays=''
     on_signal ''
     pegasus_find_other_computers
     if pegasus_remove_modules && pegasus_delete_classes; then

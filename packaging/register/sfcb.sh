@@ -38,12 +38,14 @@ sfcb_rebuild() {
     run sfcbrepos -f ${sfcb_directory:+-s "$sfcb_directory/stage" -r "$sfcb_directory/registration"}
 }
 
-# Their names in the stage.
+# Names in the stage of those that are not to stay there.
 sfcb_registrations() {
     for file in "$data"/*.reg "$data"/*/*.reg; do
         [ "$others ${file##*/}" = "yes $computers.reg" ] || echo "${file##*/}"
     done
-    sfcb_former_registration
+    if [ "$command" = unregister ] || ! has_former_computers; then
+        sfcb_former_registration
+    fi
 }
 
 # That of our computers by their former name, if it is staged. Somebody else's may bear that name too.

@@ -20,6 +20,43 @@ register unregister
 ends_with 1
 says "SFCB: unregistered"
 
+begin "Computers by their former name stay registered while the agent has them by that, and are replaced afterwards"
+machine "${sfcb[@]}" "${pegasus[@]}"
+former_computers() {
+    register register
+    mv "$work/prefix/lib/libOstrelComputerSystemProvider.so" "$work/prefix/lib/libComputerSystemProvider.so"
+    echo ComputerSystemProvider >"$STAND_IN/modules/OstrelComputerSystem"
+    rm "$STAND_IN/sfcb/stage/regs/OstrelComputerSystemProvider.reg"
+    sed 's/OstrelComputer/Computer/' "$root/$data/OstrelComputerSystemProvider.reg" \
+        >"$STAND_IN/sfcb/stage/regs/ComputerSystemProvider.reg"
+    sfcbrepos_of_stage
+}
+former_computers
+register --only-registered register
+ends_with 0
+says "the agent is older than this"
+provider_register 1 ComputerSystemProvider
+provider_register 6 LeaseAndWarrantyGate
+module OstrelComputerSystem ComputerSystemProvider
+module LeaseAndWarranty LeaseAndWarrantyGate
+touch "$STAND_IN/refused/LeaseAndWarrantyProvider"
+register --manager pegasus --provider bare register
+ends_with 1
+module OstrelComputerSystem ComputerSystemProvider
+module LeaseAndWarranty LeaseAndWarrantyGate
+mv "$work/prefix/lib/libComputerSystemProvider.so" "$work/prefix/lib/libOstrelComputerSystemProvider.so"
+register --only-registered register
+ends_with 0
+says_nothing_of "older"
+provider_register 0 ComputerSystemProvider
+provider_register 1 OstrelComputerSystemProvider
+module OstrelComputerSystem OstrelComputerSystemProvider
+former_computers
+register unregister
+ends_with 0
+provider_register 0 ComputerSystemProvider
+[ -z "$(ls "$STAND_IN/modules")" ] || complain "a module is still registered"
+
 begin "Without an object manager there is nothing to do"
 machine
 register register
