@@ -29,7 +29,7 @@ run() {
         return 0
     fi
     [ -z "$told" ] || show "$told" >&2
-    complain "$(what_ended "$ended"): $*"
+    complain "$(what_ended $ended): $*"
     return 1
 }
 
