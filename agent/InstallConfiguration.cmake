@@ -1,14 +1,14 @@
-# Installs the configuration file "new" into "directory", which may be seen from the prefix. One that is there and another
-# is the administrator's: it is kept, and the new one comes to lie beside it.
-cmake_path(ABSOLUTE_PATH directory BASE_DIRECTORY ${CMAKE_INSTALL_PREFIX})
-set(kept $ENV{DESTDIR}${directory}/agent.toml)
+# Installs the configuration file "new" into "directory", which may be seen from the prefix. One that is there and not
+# the same is the administrator's: it is kept, and the new one comes to lie beside it.
+cmake_path(ABSOLUTE_PATH directory BASE_DIRECTORY "${CMAKE_INSTALL_PREFIX}")
+set(kept "$ENV{DESTDIR}${directory}/agent.toml")
 set(name agent.toml)
-if(EXISTS ${kept})
-    file(SHA256 ${kept} hash_of_kept)
-    file(SHA256 ${new} hash_of_new)
+if(EXISTS "${kept}")
+    file(SHA256 "${kept}" hash_of_kept)
+    file(SHA256 "${new}" hash_of_new)
     if(NOT hash_of_kept STREQUAL hash_of_new)
         set(name agent.toml.new)
         message(STATUS "Keeping ${kept}; the new one is ${name}")
     endif()
 endif()
-file(INSTALL ${new} DESTINATION ${directory} RENAME ${name})
+file(INSTALL "${new}" DESTINATION "${directory}" RENAME ${name})

@@ -99,7 +99,7 @@ def requests_table(cases):
     for (operation, class_name), by_size in cases.items():
         for size, times in sorted(by_size.items()):
             counts = counts_of(operation, class_name, size)
-            own = [f"{(counts[0] - counts[1]) / size:,.0f}"] if counts else [""]
+            own = [f"{(counts[0] - counts[1]) / size:,.0f}" if counts else ""]
             rows.append([operation, class_name, f"{size:,}", *(time_text(times[side]) for side in SIDES),
                          ratio_text(times), *([f"{count:,}" for count in counts] or ["", ""]), *own])
     return table(["Request", "Class", "Records", "Provider", "Floor", "Ratio", "Instructions", "of the floor",
@@ -132,9 +132,11 @@ def growth_table(cases):
     for (operation, class_name), by_size in cases.items():
         largest = max(by_size)
         if largest > 100000:
-            rows.append([operation, class_name, *(cell for side in (*SIDES, "own") for cell in growth_cells(by_size, side))])
-    return table(["Request", "Class", "Of 10,000", "of 1,000,000", "growth", "Floor: of 10,000", "of 1,000,000", "growth",
-                  "Provider's own: of 10,000", "of 1,000,000", "growth"], rows)
+            cells = [cell for side in (*SIDES, "own") for cell in growth_cells(by_size, side)]
+            rows.append([operation, class_name, *cells])
+    head = ["of 10,000", "of 1,000,000", "growth"]
+    return table(["Request", "Class", *head, f"floor: {head[0]}", *head[1:], f"provider's own: {head[0]}", *head[1:]],
+                 rows)
 
 
 def memories(results):
