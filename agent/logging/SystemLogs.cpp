@@ -72,10 +72,13 @@ private:
         return datagrams.send(form(record.level <= errorLevel ? LOG_ERR : LOG_DEBUG, cut(systemLogLine(record))));
     }
 
+    /** @return whether nothing is left to tell */
     bool tellOfDropped() {
+        if (dropped == 0) {
+            return true;
+        }
         const std::string text = std::to_string(dropped) + " records were lost: the log's service did not take them";
-        if (dropped != 0 && tells &&
-            !send({Channel::log, errorLevel, ownLogger, "write", "SystemLogs.cpp", __LINE__, text})) {
+        if (tells && !send({Channel::log, errorLevel, ownLogger, "write", "SystemLogs.cpp", __LINE__, text})) {
             return false;
         }
         dropped = 0;
