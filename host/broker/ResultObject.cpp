@@ -9,6 +9,14 @@ ResultEvents& events(const CMPIResult* result) {
     return *content(result).events;
 }
 
+/** Records a null pointer before argument() refuses it. */
+template <class Handle>
+void recordNull(const ResultContent& target, const Handle* returned) {
+    if (returned == nullptr) {
+        target.events->emplace_back(NullResult{});
+    }
+}
+
 void noticeRelease(ResultContent& result, const CMPIObjectPath* path) {
     if (result.pathReleased == nullptr) {
         result.pathReleased = std::make_shared<bool>(false);
@@ -37,6 +45,7 @@ CMPIStatus returnInstance(const CMPIResult* result, const CMPIInstance* instance
         if (target.rules.refusesInstances) {
             throw Failure(CMPI_RC_ERR_NOT_SUPPORTED);
         }
+        recordNull(target, instance);
         target.events->emplace_back(argument(instance).value);
     });
 }
@@ -44,6 +53,7 @@ CMPIStatus returnInstance(const CMPIResult* result, const CMPIInstance* instance
 CMPIStatus returnObjectPath(const CMPIResult* result, const CMPIObjectPath* path) {
     return guarded([&] {
         ResultContent& target = content(result);
+        recordNull(target, path);
         target.events->emplace_back(argument(path));
         if (target.rules.keepsPaths) {
             noticeRelease(target, path);
@@ -63,8 +73,9 @@ CMPIStatus returnDone(const CMPIResult* result) {
 
 CMPIStatus returnError(const CMPIResult* result, const CMPIError* error) {
     return guarded([&] {
-        ResultEvents& target = events(result);
-        target.emplace_back(argument(error));
+        const ResultContent& target = content(result);
+        recordNull(target, error);
+        target.events->emplace_back(argument(error));
     });
 }
 

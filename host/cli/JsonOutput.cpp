@@ -98,6 +98,7 @@ struct EventJson {
                 {"name", codeName(error.statusCode)},
                 {"message", error.message ? Json(*error.message) : Json(nullptr)}};
     }
+    Json operator()(const NullResult&) const { return {{"kind", "null"}}; }
     Json operator()(const Done&) const { return {{"kind", "done"}}; }
 };
 

@@ -43,6 +43,7 @@ struct EventText {
     std::string operator()(const ErrorInfo& error) const {
         return errorText({error.statusCode, error.message.value_or("")}) + "\n";
     }
+    std::string operator()(const NullResult&) const { return "null (refused)\n"; }
     std::string operator()(const Done&) const { return "done\n"; }
 };
 

@@ -12,8 +12,11 @@ namespace cimhost {
 /** A provider's announcement that it returns nothing more. */
 struct Done {};
 
-/** One thing that a provider handed to its result: an instance, an object path, data, an error, or that it is done. */
-using ResultEvent = std::variant<Instance, ObjectPath, Value, ErrorInfo, Done>;
+/** A null pointer that a provider returned as an instance, an object path or an error. The result refused it. */
+struct NullResult {};
+
+/** What a provider passed to its result: an instance, an object path, data, an error, null, or that it is done. */
+using ResultEvent = std::variant<Instance, ObjectPath, Value, ErrorInfo, NullResult, Done>;
 
 /** What a provider returned, in order, each as it was at the time of the call. */
 using ResultEvents = std::vector<ResultEvent>;

@@ -28,7 +28,7 @@ constexpr auto brokenResponse =
 template <class Kind>
 bool isKindOrSilent(const ResultEvent& event) {
     return std::holds_alternative<Kind>(event) || std::holds_alternative<Done>(event) ||
-           std::holds_alternative<ErrorInfo>(event);
+           std::holds_alternative<ErrorInfo>(event) || std::holds_alternative<NullResult>(event);
 }
 
 template <class Kind>

@@ -50,8 +50,22 @@ void Recording::orderData(const std::string& function, const std::string& name, 
     dataOrders[{function, cimhost::foldedName(name)}] = verdict;
 }
 
+void Recording::orderState(const std::string& function, CMPIValueState state) {
+    requireFunction(function);
+    const std::lock_guard<std::mutex> lock(mutex);
+    states[function] = state;
+}
+
+CMPIData Recording::withOrderedState(const std::string& function, CMPIData data) const {
+    const std::lock_guard<std::mutex> lock(mutex);
+    const auto ordered = states.find(function);
+    data.state = ordered == states.end() ? data.state : ordered->second;
+    return data;
+}
+
 void Recording::obey() {
     const std::lock_guard<std::mutex> lock(mutex);
+    states.clear();
     orders.clear();
     dataOrders.clear();
 }

@@ -50,6 +50,10 @@ public:
     /** An order for a call of a function: by its number from now, or for every one when the number is none. */
     void order(const std::string& function, std::optional<int> number, Verdict verdict);
     void orderData(const std::string& function, const std::string& name, Verdict verdict);
+    void orderState(const std::string& function, CMPIValueState state);
+
+    /** The data as the function returns them: with another state if one is ordered for it. */
+    CMPIData withOrderedState(const std::string& function, CMPIData data) const;
     void obey();
 
     std::vector<RecordedCall> calls() const;
@@ -66,6 +70,7 @@ private:
     std::map<std::string, int> counts;  ///< calls of each function since the beginning
     std::map<std::string, std::vector<Order>> orders;
     std::map<std::pair<std::string, std::string>, Verdict> dataOrders;  ///< by function and name in lower case
+    std::map<std::string, CMPIValueState> states;                       ///< ordered, by function
     std::set<const void*> silent;                                       ///< strings without characters
 };
 
@@ -167,7 +172,11 @@ struct Recorded<slot> {
             (setStatus(arguments, verdict->rc), ...);
             return emptyAnswer<Result>(*verdict);
         }
-        return original(arguments...);
+        if constexpr (std::is_same_v<Result, CMPIData>) {
+            return recording->withOrderedState(name, original(arguments...));
+        } else {
+            return original(arguments...);
+        }
     }
 };
 

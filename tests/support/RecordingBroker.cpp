@@ -169,6 +169,10 @@ void RecordingBroker::answerData(const std::string& function, const std::string&
     state->recording.orderData(function, name, {rc, data});
 }
 
+void RecordingBroker::answerState(const std::string& function, CMPIValueState valueState) {
+    state->recording.orderState(function, valueState);
+}
+
 void RecordingBroker::obey() {
     state->recording.obey();
 }

@@ -92,6 +92,13 @@ public:
      */
     void answerData(const std::string& function, const std::string& name, const CMPIData& data, CMPIrc rc = CMPI_RC_OK);
 
+    /**
+     * Sets the state of all data that a function returns (CMPIObjectPathFT.getKey, getKeyAt,
+     * CMPIInstanceFT.getProperty, getPropertyAt, CMPIEnumerationFT.getNext, CMPIArrayFT.getElementAt,
+     * CMPIContextFT.getEntry...). Status, type and value remain those of the broker.
+     */
+    void answerState(const std::string& function, CMPIValueState valueState);
+
     /** Takes all orders back; poses stay. */
     void obey();
     ///@}

@@ -136,6 +136,45 @@ TEST_F(RecordingBrokerTest, AnswersAKeyAsTold) {
     EXPECT_EQ(status.rc, CMPI_RC_ERR_NOT_FOUND);
 }
 
+TEST_F(RecordingBrokerTest, ReturnsEachStateThatIsOrderedInEachPlace) {
+    CMPIObjectPath* path = newPath();
+    path->ft->addKey(path, "K", chars("v"), CMPI_chars);
+    CMPIInstance* instance = handle()->eft->newInstance(handle(), path, nullptr);
+    instance->ft->setProperty(instance, "P", chars("v"), CMPI_chars);
+    recorder.serve("Computer", {testsupport::instance(testsupport::objectPath("root/cimv2", "Computer"))});
+    const CMPIObjectPath* computers = handle()->eft->newObjectPath(handle(), "root/cimv2", "Computer", nullptr);
+    for (const int state : {CMPI_goodValue, CMPI_nullValue, CMPI_keyValue, CMPI_notFound, CMPI_badValue}) {
+        const auto ordered = static_cast<CMPIValueState>(state);
+        for (const char* function :
+             {"CMPIObjectPathFT.getKey", "CMPIObjectPathFT.getKeyAt", "CMPIInstanceFT.getProperty",
+              "CMPIInstanceFT.getPropertyAt", "CMPIEnumerationFT.getNext"}) {
+            recorder.answerState(function, ordered);
+        }
+        EXPECT_EQ(path->ft->getKey(path, "K", &status).state, ordered);
+        EXPECT_EQ(path->ft->getKeyAt(path, 0, nullptr, &status).state, ordered);
+        EXPECT_EQ(instance->ft->getProperty(instance, "P", &status).state, ordered);
+        EXPECT_EQ(instance->ft->getPropertyAt(instance, 0, nullptr, &status).state, ordered);
+        const CMPIEnumeration* found =
+            handle()->bft->enumerateInstances(handle(), nullptr, computers, nullptr, &status);
+        const CMPIData element = found->ft->getNext(found, &status);
+        EXPECT_EQ(element.state, ordered);
+        EXPECT_NE(element.value.inst, nullptr);
+        EXPECT_EQ(status.rc, CMPI_RC_OK);
+    }
+    recorder.obey();
+    EXPECT_EQ(path->ft->getKeyAt(path, 0, nullptr, &status).state, CMPI_keyValue);
+}
+
+TEST_F(RecordingBrokerTest, ShowsTheNullPointersThatAProviderReturns) {
+    cimhost::ResultEvents events;
+    const CMPIResult* result = scope.result(events);
+    EXPECT_EQ(result->ft->returnInstance(result, nullptr).rc, CMPI_RC_ERR_INVALID_PARAMETER);
+    EXPECT_EQ(result->ft->returnObjectPath(result, nullptr).rc, CMPI_RC_ERR_INVALID_PARAMETER);
+    ASSERT_EQ(events.size(), 2U);
+    EXPECT_TRUE(std::holds_alternative<cimhost::NullResult>(events.front()));
+    EXPECT_TRUE(std::holds_alternative<cimhost::NullResult>(events.back()));
+}
+
 TEST_F(RecordingBrokerTest, RefusesNamesOfNoFunction) {
     EXPECT_THROW(recorder.failEvery("CMPIStringFT.getChars", CMPI_RC_ERR_FAILED), std::invalid_argument);
     EXPECT_THROW(recorder.count("getCharPtr"), std::invalid_argument);
