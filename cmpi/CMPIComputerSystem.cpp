@@ -3,6 +3,7 @@
 #include "Exceptions.h"
 #include "LoggerNames.h"
 #include "Trace.h"
+#include "cim/CmpiAccess.h"
 
 #include <cmpift.h>
 
@@ -40,8 +41,7 @@ bool CMPILAWComputerSystem::takeNext() {
     if (status.rc != CMPI_RC_OK) {
         return false;
     }
-    const bool isInstance = next.type == CMPI_instance && (next.state & CMPI_nullValue) == 0;
-    current = isInstance ? next.value.inst : nullptr;
+    current = cim::elementInstance(next);
     return true;
 }
 

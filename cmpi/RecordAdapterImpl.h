@@ -9,6 +9,7 @@
 #include "PropertyTable.h"
 #include "RecordAdapter.h"
 #include "Trace.h"
+#include "cim/CmpiAccess.h"
 
 #include <cmpift.h>
 
@@ -25,8 +26,8 @@ constexpr const char* instanceIdKey = "InstanceID";
 std::optional<std::string> stringKey(const CMPIObjectPath* path, const char* name) {
     CMPIStatus status{CMPI_RC_OK, nullptr};
     const CMPIData key = path->ft->getKey(path, name, &status);
-    const bool isText = key.type == CMPI_string && (key.state & (CMPI_nullValue | CMPI_notFound | CMPI_badValue)) == 0;
-    if (status.rc != CMPI_RC_OK || !isText || key.value.string == nullptr) {
+    const bool isString = cim::hasValue(key) && key.type == CMPI_string;
+    if (status.rc != CMPI_RC_OK || !isString || key.value.string == nullptr) {
         return std::nullopt;
     }
     const char* characters = key.value.string->ft->getCharPtr(key.value.string, &status);

@@ -1,6 +1,7 @@
 #include "Links.h"
 
 #include "Calls.h"
+#include "Log.h"
 #include "Objects.h"
 #include "Values.h"
 
@@ -9,6 +10,15 @@
 namespace gate {
 
 namespace {
+
+/** Fails unless the computers could be enumerated. The log has the reason, too: clients often drop it. */
+void requireEnumerated(bool isDone, const CMPIStatus& status) {
+    if (!isDone) {
+        const std::string text = failureText("enumerate VELKO_ComputerSystem", status);
+        logError(text);
+        fail(CMPI_RC_ERR_FAILED, text);
+    }
+}
 
 CMPIEnumeration* enumerateComputers(const Request& request, const Provider& provider) {
     const CMPIBroker& broker = *request.broker;
@@ -21,13 +31,13 @@ CMPIEnumeration* enumerateComputers(const Request& request, const Provider& prov
     provider.letOthersIn([&] {
         computers = broker.bft->enumerateInstances(request.broker, request.context, classPath, nullptr, &status);
     });
-    require(status.rc == CMPI_RC_OK && computers != nullptr, "enumerate computers", status);
+    requireEnumerated(status.rc == CMPI_RC_OK && computers != nullptr, status);
     return computers;
 }
 
 bool hasNext(CMPIEnumeration* computers) {
     const auto answer = ask<&CMPIEnumerationFT::hasNext>(computers);
-    require(answer.isOk(), "enumerate computers", answer.status);
+    requireEnumerated(answer.isOk(), answer.status);
     return answer.value != 0;
 }
 
@@ -56,10 +66,8 @@ std::vector<Computer> knownComputers(const Request& request, const Provider& pro
     CMPIEnumeration* enumeration = enumerateComputers(request, provider);
     while (hasNext(enumeration)) {
         const auto next = ask<&CMPIEnumerationFT::getNext>(enumeration);
-        const bool isInstance = next.isOk() && next.value.type == CMPI_instance &&
-                                (next.value.state & CMPI_nullValue) == 0 && next.value.value.inst != nullptr;
-        require(isInstance, "enumerate computers", next.status);
-        CMPIInstance* instance = next.value.value.inst;
+        CMPIInstance* instance = next.isOk() ? cim::elementInstance(next.value) : nullptr;
+        requireEnumerated(instance != nullptr, next.status);
         const CMPIObjectPath* path = computerPathOf(request, instance);
         if (nameSpaceOf(pathOf(instance)).empty()) {
             // So that the instance and its name are the same; a manager that cannot do that has it as it was.

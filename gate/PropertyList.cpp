@@ -74,9 +74,8 @@ const CMPIInstance* PropertyList::applied(const Request& request, const CMPIInst
         require(answer.isOk() || saysAbsent(answer.status), "give the value of a property", answer.status);
         const bool isThere = answer.isOk() && (answer.value.state & (CMPI_notFound | CMPI_badValue)) == 0;
         if (isThere && (property.isKey || has(property))) {
-            const bool isNull = (answer.value.state & CMPI_nullValue) != 0;
-            const CMPIStatus status = tell<&CMPIInstanceFT::setProperty>(
-                made, property.name, isNull ? nullptr : &answer.value.value, answer.value.type);
+            const CMPIValue* value = cim::hasValue(answer.value) ? &answer.value.value : nullptr;
+            const CMPIStatus status = tell<&CMPIInstanceFT::setProperty>(made, property.name, value, answer.value.type);
             require(status.rc == CMPI_RC_OK, "set a property", status);
         }
     }

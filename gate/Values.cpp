@@ -10,23 +10,13 @@ namespace gate {
 
 namespace {
 
-constexpr unsigned int flaws = CMPI_nullValue | CMPI_notFound | CMPI_badValue;
-
-bool isThere(const CMPIData& data) {
-    return (data.state & flaws) == 0 && data.type != CMPI_null;
-}
-
 std::optional<std::string> charactersOf(const char* characters) {
     return characters == nullptr ? std::nullopt : std::optional<std::string>(characters);
 }
 
-std::optional<std::string> charactersOf(const CMPIString* string) {
-    return charactersOf(ask<&CMPIStringFT::getCharPtr>(string).value);
-}
-
 /** A datetime's characters; none for a null one, although the value is there. */
 std::optional<std::string> charactersOf(const CMPIDateTime* dateTime) {
-    return charactersOf(ask<&CMPIDateTimeFT::getStringFormat>(dateTime).value);
+    return cim::charactersOf(ask<&CMPIDateTimeFT::getStringFormat>(dateTime).value);
 }
 
 /** The value's text, by its own type; none for a type that no class here has. */
@@ -36,7 +26,7 @@ std::optional<std::string> textOf(const CMPIData& data) {
         case CMPI_chars:
             return charactersOf(value.chars);
         case CMPI_string:
-            return charactersOf(value.string);
+            return cim::charactersOf(value.string);
         case CMPI_dateTime:
             return charactersOf(value.dateTime);
         case CMPI_boolean:
@@ -124,7 +114,7 @@ std::optional<std::string> valueOf(const CMPIData& data, const CMPIStatus& statu
         return std::nullopt;
     }
     require(status.rc == CMPI_RC_OK, (std::string("give the value of ") + property.name).c_str(), status);
-    if (!isThere(data)) {
+    if (!cim::hasValue(data)) {
         return std::nullopt;
     }
     if (!standsFor(data.type, property.type)) {
@@ -146,13 +136,13 @@ std::optional<std::string> propertyOf(const CMPIInstance* instance, const Proper
 
 std::optional<std::string> keyOf(const CMPIObjectPath* path, const Property& property) {
     const auto answer = ask<&CMPIObjectPathFT::getKey>(path, property.name);
-    const bool isUsable = answer.isOk() && isThere(answer.value) && standsFor(answer.value.type, property.type);
+    const bool isUsable = answer.isOk() && cim::hasValue(answer.value) && standsFor(answer.value.type, property.type);
     return isUsable ? textOf(answer.value) : std::nullopt;
 }
 
 CMPIObjectPath* referenceOf(const CMPIObjectPath* path, const char* key) {
     const auto answer = ask<&CMPIObjectPathFT::getKey>(path, key);
-    const bool isUsable = answer.isOk() && isThere(answer.value) && answer.value.type == CMPI_ref;
+    const bool isUsable = answer.isOk() && cim::hasValue(answer.value) && answer.value.type == CMPI_ref;
     return isUsable ? answer.value.value.ref : nullptr;
 }
 

@@ -21,9 +21,9 @@ using Values = std::vector<std::pair<const Property*, std::string>>;
 constexpr const char* noDate = "00000000000000.000000-000";
 
 /**
- * The value that an object manager gave for a property; none when there is none or it is null. The state comes first,
- * then the pointer, then the characters: brokers give null values pointers to strings without characters.
- * Fails when it is of another type or does not fit, or when the object manager could not give it.
+ * The value that an object manager gave for a property; none when there is none or it is null. See
+ * cim::hasValue() for what decides. Fails when it is of another type or does not fit, or when the object manager could
+ * not give it.
  */
 std::optional<std::string> valueOf(const CMPIData& data, const CMPIStatus& status, const Property& property);
 

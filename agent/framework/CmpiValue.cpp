@@ -6,13 +6,8 @@ namespace KO {
 
 namespace {
 
-/**
- * A value that can be looked at. The state comes first: a broker may give a null value a pointer to
- * a string without characters. That a value is a key's is no flaw.
- */
 bool isPresent(const CMPIData& data, const CMPIStatus& status, CMPIType type) {
-    constexpr unsigned int flaws = CMPI_nullValue | CMPI_notFound | CMPI_badValue;
-    return status.rc == CMPI_RC_OK && (data.state & flaws) == 0 && data.type == type;
+    return status.rc == CMPI_RC_OK && cim::hasValue(data) && data.type == type;
 }
 
 struct Integer {
@@ -55,25 +50,18 @@ std::optional<Integer> integerOf(const CMPIData& data, const CMPIStatus& status)
 
 }  // namespace
 
-std::optional<std::string> textOf(const CMPIString* string) {
-    CMPIStatus status{};
-    const char* characters = callTable<&CMPIStringFT::getCharPtr>(string, &status);
-    return characters != nullptr ? std::optional<std::string>(characters) : std::nullopt;
-}
-
 std::optional<std::string> textOf(const CMPIData& data, const CMPIStatus& status) {
     if (isPresent(data, status, CMPI_chars) && data.value.chars != nullptr) {
         return data.value.chars;
     }
-    return isPresent(data, status, CMPI_string) ? textOf(data.value.string) : std::nullopt;
+    return isPresent(data, status, CMPI_string) ? cim::charactersOf(data.value.string) : std::nullopt;
 }
 
 std::optional<std::string> dateTimeTextOf(const CMPIData& data, const CMPIStatus& status) {
     if (!isPresent(data, status, CMPI_dateTime)) {
         return std::nullopt;
     }
-    CMPIStatus formatting{};
-    return textOf(callTable<&CMPIDateTimeFT::getStringFormat>(data.value.dateTime, &formatting));
+    return cim::charactersOf(cim::ask<&CMPIDateTimeFT::getStringFormat>(data.value.dateTime).value);
 }
 
 std::optional<unsigned int> numberOf(const CMPIData& data, const CMPIStatus& status) {

@@ -32,24 +32,24 @@ const CMPIValue* asValue(const char* characters) {
     return reinterpret_cast<const CMPIValue*>(characters);
 }
 
-CMPIData getKey(const CMPIObjectPath* path, const char* name, CMPIStatus& status) {
-    return name != nullptr ? callTable<&CMPIObjectPathFT::getKey>(path, name, &status) : CMPIData{};
+cim::Answer<CMPIData> getKey(const CMPIObjectPath* path, const char* name) {
+    return name != nullptr ? cim::ask<&CMPIObjectPathFT::getKey>(path, name) : cim::Answer<CMPIData>{};
 }
 
 void addKey(CMPIObjectPath* path, const char* name, const CMPIValue* value, CMPIType type) {
     if (name != nullptr) {
-        callTable<&CMPIObjectPathFT::addKey>(path, name, value, type);
+        cim::tell<&CMPIObjectPathFT::addKey>(path, name, value, type);
     }
 }
 
-CMPIData getPropertyData(const CMPIInstance* instance, const char* name, CMPIStatus& status) {
-    return name != nullptr ? callTable<&CMPIInstanceFT::getProperty>(instance, name, &status) : CMPIData{};
+cim::Answer<CMPIData> getPropertyData(const CMPIInstance* instance, const char* name) {
+    return name != nullptr ? cim::ask<&CMPIInstanceFT::getProperty>(instance, name) : cim::Answer<CMPIData>{};
 }
 
 /** @param value null sets the property to null */
 void setPropertyValue(CMPIInstance* instance, const char* name, const CMPIValue* value, CMPIType type) {
     if (name != nullptr) {
-        callTable<&CMPIInstanceFT::setProperty>(instance, name, value, type);
+        cim::tell<&CMPIInstanceFT::setProperty>(instance, name, value, type);
     }
 }
 
@@ -57,7 +57,7 @@ CMPIDateTime* makeDateTime(const CMPIBroker* broker, const std::string& text) {
     if (!isPointInTime(text) && !isInterval(text)) {
         return nullptr;
     }
-    return makeObject<&CMPIBrokerEncFT::newDateTimeFromChars>(broker, text.c_str());
+    return cim::make<&CMPIBrokerEncFT::newDateTimeFromChars>(broker, text.c_str());
 }
 
 /** Hands a value over if there is one. @return whether there was */
@@ -72,8 +72,7 @@ bool deliver(std::optional<Value> found, Value& value) {
 }  // namespace
 
 unsigned short ProviderUtilities::getClassId(const CMPIObjectPath* path) {
-    CMPIStatus status{};
-    const std::optional<std::string> name = textOf(callTable<&CMPIObjectPathFT::getClassName>(path, &status));
+    const std::optional<std::string> name = cim::charactersOf(cim::ask<&CMPIObjectPathFT::getClassName>(path).value);
     return name ? getClassId(name->c_str()) : ClassId::unknown;
 }
 
@@ -89,25 +88,21 @@ unsigned short ProviderUtilities::getClassId(const char* className) {
 }
 
 std::string ProviderUtilities::getNamespace(const CMPIObjectPath* path) {
-    CMPIStatus status{};
-    return textOf(callTable<&CMPIObjectPathFT::getNameSpace>(path, &status)).value_or(std::string());
+    return cim::charactersOf(cim::ask<&CMPIObjectPathFT::getNameSpace>(path).value).value_or(std::string());
 }
 
 unsigned short ProviderUtilities::getKeyCount(const CMPIObjectPath* path) {
-    CMPIStatus status{};
-    const CMPICount count = callTable<&CMPIObjectPathFT::getKeyCount>(path, &status);
+    const CMPICount count = cim::ask<&CMPIObjectPathFT::getKeyCount>(path).value;
     return static_cast<unsigned short>(std::min<CMPICount>(count, 0xFFFF));
 }
 
 bool ProviderUtilities::getKeyProperty(const CMPIObjectPath* path, const char* name, std::string& value) {
-    CMPIStatus status{};
-    const CMPIData data = getKey(path, name, status);
+    const auto [data, status] = getKey(path, name);
     return deliver(textOf(data, status), value);
 }
 
 bool ProviderUtilities::getKeyProperty(const CMPIObjectPath* path, const char* name, CMPIObjectPath** value) {
-    CMPIStatus status{};
-    const CMPIData data = getKey(path, name, status);
+    const auto [data, status] = getKey(path, name);
     CMPIObjectPath* reference = referenceOf(data, status);
     if (reference == nullptr || value == nullptr) {
         return false;
@@ -121,7 +116,7 @@ CMPIObjectPath* ProviderUtilities::createObjectPath(const CMPIBroker* broker, co
     if (className == nullptr) {
         return nullptr;
     }
-    return makeObject<&CMPIBrokerEncFT::newObjectPath>(broker, nameSpace.c_str(), className);
+    return cim::make<&CMPIBrokerEncFT::newObjectPath>(broker, nameSpace.c_str(), className);
 }
 
 void ProviderUtilities::setKeyProperty(CMPIObjectPath* path, const char* name, const std::string& value) {
@@ -137,7 +132,7 @@ void ProviderUtilities::setKeyProperty(CMPIObjectPath* path, const char* name, C
 }
 
 CMPIInstance* ProviderUtilities::createInstance(const CMPIBroker* broker, CMPIObjectPath* path) {
-    return path != nullptr ? makeObject<&CMPIBrokerEncFT::newInstance>(broker, path) : nullptr;
+    return path != nullptr ? cim::make<&CMPIBrokerEncFT::newInstance>(broker, path) : nullptr;
 }
 
 void ProviderUtilities::setProperty(CMPIInstance* instance, const char* name, std::string& value) {
@@ -183,32 +178,27 @@ void ProviderUtilities::setProperty(const CMPIBroker* broker, CMPIInstance* inst
 
 bool ProviderUtilities::getProperty(const CMPIInstance* instance, const char* name, std::string& value,
                                     bool /*isDateTime*/) {
-    CMPIStatus status{};
-    const CMPIData data = getPropertyData(instance, name, status);
+    const auto [data, status] = getPropertyData(instance, name);
     return deliver(dateTimeTextOf(data, status), value) || deliver(textOf(data, status), value);
 }
 
 bool ProviderUtilities::getProperty(const CMPIInstance* instance, const char* name, unsigned int& value) {
-    CMPIStatus status{};
-    const CMPIData data = getPropertyData(instance, name, status);
+    const auto [data, status] = getPropertyData(instance, name);
     return deliver(numberOf(data, status), value);
 }
 
 bool ProviderUtilities::getProperty(const CMPIInstance* instance, const char* name, bool& value) {
-    CMPIStatus status{};
-    const CMPIData data = getPropertyData(instance, name, status);
+    const auto [data, status] = getPropertyData(instance, name);
     return deliver(flagOf(data, status), value);
 }
 
 void ProviderUtilities::transformObjectPathToMoniker(const CMPIObjectPath* path, Moniker& moniker) {
-    CMPIStatus counting{};
-    const CMPICount count = callTable<&CMPIObjectPathFT::getKeyCount>(path, &counting);
+    const CMPICount count = cim::ask<&CMPIObjectPathFT::getKeyCount>(path).value;
     for (CMPICount index = 0; index < count; ++index) {
-        CMPIStatus status{};
         CMPIString* nameString = nullptr;
-        const CMPIData data = callTable<&CMPIObjectPathFT::getKeyAt>(path, index, &nameString, &status);
-        const std::optional<std::string> name = textOf(nameString);
-        const std::optional<std::string> value = keyTextOf(data, status);
+        const auto key = cim::ask<&CMPIObjectPathFT::getKeyAt>(path, index, &nameString);
+        const std::optional<std::string> name = cim::charactersOf(nameString);
+        const std::optional<std::string> value = keyTextOf(key.value, key.status);
         if (name && value) {
             moniker.addKey(*name, *value);
         }

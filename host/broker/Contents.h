@@ -35,9 +35,10 @@ struct ArrayContent {
     std::vector<Scalar> elements{};
 };
 
-/** Content of a CMPIEnumeration: elements of one type, and how many of them were taken. */
+/** Content of a CMPIEnumeration: elements of one type, the state that getNext gives them, and how many were taken. */
 struct EnumerationContent {
     CMPIType type = CMPI_null;
+    CMPIValueState state = CMPI_goodValue;
     std::vector<Scalar> elements{};
     std::size_t taken = 0;
 };

@@ -12,7 +12,9 @@ CMPIData getNext(const CMPIEnumeration* enumeration, CMPIStatus* rc) {
         if (from.taken >= from.elements.size()) {
             throw Failure(CMPI_RC_ERR_FAILED, "The enumeration has no more elements.");
         }
-        return dataFrom(from.elements[from.taken++], from.type, arenaFor(object));
+        CMPIData element = dataFrom(from.elements[from.taken++], from.type, arenaFor(object));
+        element.state = from.state;
+        return element;
     });
 }
 

@@ -53,6 +53,7 @@ Profile openPegasusProfile() {
     profile.created = CreationResult::pathOnly;
     profile.completesInstances = true;
     profile.creationKey = CreationKey::unreadable;
+    profile.marksElementsNull = true;
     profile.namesAllProperties = true;
     profile.refusesEmptyGet = true;
     profile.emptiesReferences = true;

@@ -77,6 +77,7 @@ struct Profile {
     bool filterHidesKeys;         ///< a property filter shows what it lists, keys or not
     bool staysIfAllAsk;           ///< an idle library stays if all its interfaces ask for it, not if one does
     bool completesInstances;      ///< all properties of the class are there at creation and modification, unset: null
+    bool marksElementsNull;       ///< CMPIEnumeration.getNext gives good elements the state CMPI_nullValue
     bool hollowTexts;             ///< unset texts, principal and role are string objects without characters
     bool namesAllProperties;      ///< the property list is never null, and that of a modification has the keys
     bool fillsAssociationClass;   ///< a provider is told the association class also when the client names none

@@ -35,7 +35,9 @@ std::optional<std::string> textIfAny(const char* text) {
 
 template <class Kind>
 CMPIEnumeration* enumerationOf(Broker& broker, CMPIType type, std::vector<Kind> values) {
-    EnumerationContent content{type, {}, 0};
+    const bool isMarkedNull = broker.profile().marksElementsNull;
+    EnumerationContent content{
+        type, static_cast<CMPIValueState>(isMarkedNull ? CMPI_nullValue : CMPI_goodValue), {}, 0};
     content.elements.reserve(values.size());
     for (Kind& value : values) {
         content.elements.emplace_back(std::make_shared<const Kind>(std::move(value)));

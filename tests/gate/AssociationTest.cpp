@@ -67,6 +67,14 @@ protected:
     }
 };
 
+TEST_F(AssociationTest, ComputersCountWhateverTheStateOfTheElementsThatTheManagerReturns) {
+    for (const int state : {CMPI_goodValue, CMPI_nullValue, CMPI_keyValue, CMPI_notFound, CMPI_badValue}) {
+        broker.answerState("CMPIEnumerationFT.getNext", static_cast<CMPIValueState>(state));
+        EXPECT_THAT(names(computerPath("alpha")), UnorderedElementsAre(firstLease, firstWarranty));
+        EXPECT_THAT(names(keyedPath(lease, firstPlace)), ElementsAre(alpha));
+    }
+}
+
 TEST_F(AssociationTest, FromAComputerToWhatBelongsToIt) {
     EXPECT_THAT(names(computerPath("alpha")), UnorderedElementsAre(firstLease, firstWarranty));
     EXPECT_THAT(names(computerPath("beta")), ElementsAre(secondLease));
@@ -215,13 +223,29 @@ TEST_F(AssociationTest, WithoutComputersThereIsNothingToTell) {
 
 TEST_F(AssociationTest, AManagerThatCannotEnumerateComputersIsNamed) {
     broker.failEnumeration("VELKO_ComputerSystem", CMPI_RC_ERR_ACCESS_DENIED);
-    const auto refused = isRefused(CMPI_RC_ERR_FAILED, "enumerate computers");
+    const auto refused = isRefused(CMPI_RC_ERR_FAILED, "enumerate VELKO_ComputerSystem");
     EXPECT_THAT(gate().enumerateInstances(classPath(leaseSetting)), refused);
     EXPECT_THAT(gate().enumerateInstanceNames(classPath(warrantySetting)), refused);
     EXPECT_THAT(gate().associatorNames(keyedPath(lease, firstPlace), {}), refused);
     EXPECT_THAT(gate().associators(computerPath("alpha"), {}), refused);
     EXPECT_THAT(gate().references(computerPath("alpha"), {}), refused);
     EXPECT_THAT(gate().referenceNames(computerPath("alpha"), {}), refused);
+}
+
+TEST_F(AssociationTest, TheStatusAndReasonOfAFailedEnumerationAreInTheAnswerAndInTheLog) {
+    broker.failEnumeration("VELKO_ComputerSystem", CMPI_RC_ERR_ACCESS_DENIED);
+    agentEnvironment::forgetLog();
+    const Outcome outcome = gate().enumerateInstances(classPath(leaseSetting));
+    EXPECT_THAT(outcome.message, testing::HasSubstr("code 2, "));
+    std::vector<std::string> logged;
+    for (const agentEnvironment::LogRecord& record : agentEnvironment::log()) {
+        if (record.logger == "Tarvik.LeaseAndWarrantyGate") {
+            EXPECT_EQ(record.level, 3000);
+            EXPECT_EQ(record.file, "Links.cpp");
+            logged.push_back(record.channel + ": " + record.text);
+        }
+    }
+    EXPECT_THAT(logged, ElementsAre("log: " + outcome.message, "trace: " + outcome.message));
 }
 
 TEST_F(AssociationTest, NothingElseHasAssociations) {

@@ -38,7 +38,7 @@ public:
     CMPIInstance* instance(std::size_t index) { return &instances.at(index); }
     CMPIObjectPath* path(std::size_t index) { return &paths.at(index); }
 
-    /** What the enumeration gives for one of its elements in place of an instance. */
+    /** Sets the type and the state of one of the enumeration's elements. */
     void give(std::size_t index, CMPIType type, CMPIValueState state) {
         types.at(index) = type;
         states.at(index) = state;
@@ -225,16 +225,27 @@ TEST_F(ComputerSystemAdapter, HasNoPathWhereTheInstanceDoesNotTellIt) {
     EXPECT_EQ(adapter.getCMPIInstance(nullptr), manager.instance(0));
 }
 
-TEST_F(ComputerSystemAdapter, StandsOnNoneWhereTheEnumerationGivesNoInstance) {
-    Manager manager(3);
+TEST_F(ComputerSystemAdapter, HasNoInstanceIfTheElementIsOfAnotherType) {
+    Manager manager(2);
     manager.give(1, CMPI_string, CMPI_goodValue);
-    manager.give(2, CMPI_instance, CMPI_nullValue);
     CMPILAWComputerSystem adapter(manager.broker(), manager.context(), "root/cimv2");
     adapter.setObjectPath(manager.classPath());
-    for (int steps = 0; steps < 2; ++steps) {
+    ++adapter;
+    EXPECT_EQ(adapter.getCMPIInstance(nullptr), nullptr);
+    EXPECT_EQ(adapter.getObjectPath(), nullptr);
+}
+
+TEST_F(ComputerSystemAdapter, TakesInstancesFromTheEnumerationWhateverTheirState) {
+    Manager manager(3);
+    manager.give(0, CMPI_instance, CMPI_nullValue);
+    manager.give(1, CMPI_instance, CMPI_notFound);
+    manager.give(2, CMPI_instance, CMPI_badValue);
+    CMPILAWComputerSystem adapter(manager.broker(), manager.context(), "root/cimv2");
+    adapter.setObjectPath(manager.classPath());
+    for (const std::size_t index : {0U, 1U, 2U}) {
+        EXPECT_EQ(adapter.getCMPIInstance(nullptr), manager.instance(index));
+        EXPECT_EQ(adapter.getObjectPath(), manager.path(index));
         ++adapter;
-        EXPECT_EQ(adapter.getCMPIInstance(nullptr), nullptr);
-        EXPECT_EQ(adapter.getObjectPath(), nullptr);
     }
 }
 

@@ -232,6 +232,13 @@ TEST_P(AssociationFailureTest, AnElementThatCannotBeMadeIsPassedOver) {
     EXPECT_THAT(outcome.instances(), IsEmpty());
 }
 
+TEST_P(AssociationFailureTest, ComputersCountWhateverTheStateOfTheElementsThatTheManagerReturns) {
+    for (const int state : {CMPI_goodValue, CMPI_nullValue, CMPI_keyValue, CMPI_notFound, CMPI_badValue}) {
+        broker.answerState("CMPIEnumerationFT.getNext", static_cast<CMPIValueState>(state));
+        EXPECT_THAT(textsOf(names().paths()), ElementsAre(pair("alpha", "A"), pair("alpha", "B")));
+    }
+}
+
 /** An object manager whose enumerations answer any number to the question whether there is more. */
 class OddEnumeration {
 public:
