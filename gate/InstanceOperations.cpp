@@ -241,6 +241,9 @@ bool isMadeAnew(const Provider& provider, const Target& target, const Values& va
 
 }  // namespace
 
+// A manager may crash while a client's object is read: SFCB does, for a string that was sent for a number. Requests
+// that read a client's keys and values therefore hold the lock first, so that no record file is being rewritten then.
+
 void enumerateInstanceNames(const Request& request) {
     const Class& requested = request.requestedClass();
     if (requested.isAssociation) {
@@ -267,9 +270,11 @@ void getInstance(const Request& request, const char** properties) {
     if (requested.isAssociation) {
         return getAssociation(request, requested);
     }
-    const OwnPath path = namingPath(request.path, requested);
-    const CMPIInstance* instance = existing(Provider(request), path, requested);
-    request.give(PropertyList(properties).applied(request, instance, requested));
+    const auto found = [&] {
+        const Provider provider(request);
+        return existing(provider, namingPath(request.path, requested), requested);
+    };
+    request.give(PropertyList(properties).applied(request, found(), requested));
     request.finish();
 }
 
@@ -277,11 +282,12 @@ void createInstance(const Request& request, const CMPIInstance* instance) {
     const Class& requested = request.requestedClass();
     const DataFile& file = fileOf(requested, true);
     requireInstance(instance);
+    const Provider provider(request);
     const std::string identifier = identifierFor(request.path, instance, requested);
     const Values given = valuesFor(requested, instance);
     OwnPath path(nameSpaceOf(request.path), requested.name);
     path.addKey(identifierKey, identifier);
-    create(request, Provider(request), {requested, file, std::move(path)}, given);
+    create(request, provider, {requested, file, std::move(path)}, given);
 }
 
 void modifyInstance(const Request& request, const CMPIInstance* instance, const char** properties) {
@@ -290,9 +296,9 @@ void modifyInstance(const Request& request, const CMPIInstance* instance, const 
     requireInstance(instance);
     const PropertyList list(properties);
     list.requireKnown(requested);
+    const Provider provider(request);
     const Target target{requested, file, namingPath(request.path, requested)};
     const Values given = givenValues(requested, instance, list);
-    const Provider provider(request);
     const CMPIInstance* current = existing(provider, target.path, requested);
     const Values changes = changesTo(current, given, list.isGiven());
     requireKept(file, changes);
@@ -314,8 +320,8 @@ void modifyInstance(const Request& request, const CMPIInstance* instance, const 
 void deleteInstance(const Request& request) {
     const Class& requested = request.requestedClass();
     const DataFile& file = fileOf(requested, true);
-    const Target target{requested, file, namingPath(request.path, requested)};
     const Provider provider(request);
+    const Target target{requested, file, namingPath(request.path, requested)};
     const CMPIInstance* current = existing(provider, target.path, requested);
     const Values restored = givenValues(requested, current, PropertyList(nullptr));
     file.requireWritable(0);

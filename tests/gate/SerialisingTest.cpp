@@ -4,8 +4,10 @@
 #include <condition_variable>
 #include <cstdlib>
 #include <fstream>
+#include <functional>
 #include <mutex>
 #include <thread>
+#include <utility>
 
 #include "ManagedGate.h"
 #include "Threads.h"
@@ -63,6 +65,7 @@ public:
     int awaitedComing = 0;
     int most = 0;
     bool awaitsSleep = false;  ///< inside, wait also until all others have come as far as they can
+    std::function<void()> whenOthersSleep = [] {};
 
 private:
     static CMPIInstance* newInstance(const CMPIBroker* itsBroker, const CMPIObjectPath* path, CMPIStatus* rc) {
@@ -72,13 +75,16 @@ private:
         self.most = std::max(self.most, self.inside);
         self.changed.notify_all();
         self.changed.wait(lock, [&] { return self.most >= self.awaitedInside && self.coming >= self.awaitedComing; });
-        const std::vector<pid_t> others = self.awaitsSleep ? self.threads : std::vector<pid_t>{};
-        self.awaitsSleep = false;
+        const bool hasWaited = std::exchange(self.awaitsSleep, false);
+        const std::vector<pid_t> others = hasWaited ? self.threads : std::vector<pid_t>{};
         lock.unlock();
         for (const pid_t thread : others) {
             while (thread != gettid() && !isAsleep(thread)) {
                 std::this_thread::yield();
             }
+        }
+        if (hasWaited) {
+            self.whenOthersSleep();
         }
         lock.lock();
         --self.inside;
@@ -132,6 +138,43 @@ protected:
 
 TEST_F(SerialisingTest, ThroughTheGateOneRequestAtATimeIsInside) {
     load(testsupport::underTest(GATE_LIBRARY), "LeaseAndWarrantyGate", 1);
+}
+
+TEST_F(SerialisingTest, NoKeyOrValueOfAClientIsReadWhileAnotherRequestIsInside) {
+    const ObjectPath path = keyedPath(warranty, "W1");
+    const Instance sent = testsupport::instance(path, {named("Warrantor", text("Other"))});
+    using Library = testsupport::ProviderLibrary;
+    const std::function<void(Library&)> requests[] = {
+        [&](Library& library) { library.getInstance(path); },
+        [&](Library& library) { library.createInstance(keyedPath(warranty, "W2"), sent); },
+        [&](Library& library) { library.modifyInstance(path, sent); },
+        [&](Library& library) { library.deleteInstance(path); },
+    };
+    for (const auto& request : requests) {
+        testsupport::RecordingBroker broker;
+        InsideCounter counter(*broker.handle());
+        Library library(testsupport::underTest(GATE_LIBRARY), "LeaseAndWarrantyGate", broker);
+        ASSERT_NE(library.createInstanceMI(counter.handle(), nullptr), nullptr);
+        counter.awaitedComing = 2;
+        counter.awaitsSleep = true;
+        int readBehindLock = -1;
+        counter.whenOthersSleep = [&] {
+            readBehindLock = broker.count("CMPIInstanceFT.getProperty") + broker.count("CMPIInstanceFT.getPropertyAt") +
+                             broker.count("CMPIObjectPathFT.getKey") + broker.count("CMPIObjectPathFT.getKeyAt");
+        };
+        std::thread inside([&] {
+            counter.comes();
+            library.enumerateInstances(classPath(warranty));
+        });
+        counter.awaitInside();
+        std::thread second([&] {
+            counter.comes();
+            request(library);
+        });
+        inside.join();
+        second.join();
+        EXPECT_EQ(readBehindLock, 0);
+    }
 }
 
 TEST_F(SerialisingTest, WithoutItAllRequestsAreInsideAtOnce) {
