@@ -80,7 +80,7 @@ pegasus_served() {
 }
 
 pegasus_load_classes() {
-    [ "$with_qualifiers" = no ] || run cimmof -uc -n "$namespace" "$data/qualifiers.mof" || return 1
+    [ "$with_qualifiers" = no ] || run cimmof -uc -n "$namespace" "$data/velko-qualifiers.mof" || return 1
     others=no
     if ! has_computers; then
         others=yes

@@ -86,13 +86,14 @@ sfcb_register_all() {
 }
 
 # Copies lie beside the originals, so that putting them back is renaming, which takes no space; unless an original is a
-# link to another file system.
+# link to another file system. SFCB's commands run in the directory of the copies, which has no MOF files: the compiler
+# looks for the files that the CIM schema includes, such as qualifiers.mof, in the current directory first.
 sfcb_save() {
     [ "$dry_run" = no ] || return 0
-    sfcb_copies=$(mktemp -d "$sfcb_place/before-$program.XXXXXX") || {
+    if ! sfcb_copies=$(mktemp -d "$sfcb_place/before-$program.XXXXXX") || ! cd "$sfcb_copies"; then
         complain "SFCB: $sfcb_place cannot be written to; is there another --sfcb-directory?"
         return 1
-    }
+    fi
     on_signal 'sfcb_leave "it was to end"; exit 1'
     for each in stage registration; do
         [ ! -e "$sfcb_place/$each" ] || cp -aH "$sfcb_place/$each" "$sfcb_copies/" || {
@@ -113,6 +114,7 @@ sfcb_leave() { # REASON
 sfcb_discard() {
     [ "$dry_run" = no ] || return 0
     on_signal ''
+    cd /
     rm -rf "$sfcb_copies"
     on_signal -
 }

@@ -66,6 +66,36 @@ machine "${sfcb[@]}"
 register --manager pegasus register
 ends_with 3
 
+begin "The caller's directory does not matter: one with MOF files, a deleted one or an unreadable one"
+for directory in "with MOF files" deleted unreadable; do
+    machine "${sfcb[@]}" "${pegasus[@]}" wbemcli
+    mkdir "$work/directory"
+    cd "$work/directory" || exit
+    case $directory in
+    "with MOF files") cp "$root/$data"/*.mof . && touch qualifiers.mof ;;
+    deleted) rmdir "$work/directory" ;;
+    unreadable) chmod 0 "$work/directory" ;;
+    esac
+    for command in register verify list unregister; do
+        register $command
+        ends_with 0
+    done
+    cd "$here" || exit
+done
+
+begin "Files that options name are found from the caller's directory"
+machine "${sfcb[@]}"
+sfcb_installation "$work/elsewhere/sfcb"
+echo "providerDirs: $work/prefix/lib" >"$work/elsewhere/sfcb.cfg"
+cd "$work/elsewhere" || exit
+LEASE_WARRANTY_LOCK=lock register --sfcb-directory sfcb --sfcb-config sfcb.cfg register
+cd "$here" || exit
+ends_with 0
+says_nothing_of "providerDirs"
+[ -e "$work/elsewhere/lock" ] || complain "the lock is elsewhere"
+called "sfcbrepos -f -s $work/elsewhere/sfcb/stage -r $work/elsewhere/sfcb/registration"
+grep -q LeaseAndWarrantyGate "$work/elsewhere/sfcb/registration/providerRegister" || complain "not registered there"
+
 begin "A dry run shows the commands and runs none"
 machine "${sfcb[@]}" "${pegasus[@]}"
 for command in register unregister; do

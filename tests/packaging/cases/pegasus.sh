@@ -68,7 +68,7 @@ done
 begin "OpenPegasus: the standard qualifiers where they are asked for"
 machine "${pegasus[@]}"
 register --with-qualifiers register
-in_order '^cimmof -uc -n root/cimv2 [^ ]*/qualifiers.mof$' '^cimmof -uc -n root/cimv2 [^ ]*/VELKO_ComputerSystem.mof$'
+in_order '^cimmof -uc -n root/cimv2 [^ ]*/velko-qualifiers.mof$' '^cimmof -uc -n root/cimv2 [^ ]*/VELKO_ComputerSystem.mof$'
 
 begin "OpenPegasus: classes that are refused leave what is registered, whichever of them it is"
 classes=$(sed -n 's/^#pragma include ("\(.*\).mof")$/\1/p' "$root/$data/classes.mof")
