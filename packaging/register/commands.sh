@@ -18,7 +18,7 @@ limited() {
 # command that wrote to where nobody reads would end in the middle of its work, or fail.
 run() {
     if [ "$dry_run" = yes ]; then
-        printf 'would run: %s\n' "$*"
+        show "would run: $*"
         return 0
     fi
     show "running: $*"

@@ -142,7 +142,7 @@ for streams in output both; do
     machine "${sfcb[@]}" "${pegasus[@]}"
     register register --provider bare
     touch "$STAND_IN/talkative"
-    for command in "register --provider gate" unregister; do
+    for command in "register --dry-run" "register --provider gate" unregister; do
         exec 3> >(exit 0)
         wait $!
         if [ $streams = both ]; then exec 4>&3; else exec 4>"$work/output"; fi
@@ -153,6 +153,7 @@ for streams in output both; do
         [ $streams = output ] || echo "is heard by nobody" >"$work/output"
         ends_with 0
         says_nothing_of "error"
+        [ "$command" != "register --dry-run" ] || continue
         provider_register 0 LeaseAndWarrantyProvider
         if [ "$command" = unregister ]; then
             provider_register 0 LeaseAndWarrantyGate
