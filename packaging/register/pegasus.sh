@@ -107,8 +107,17 @@ pegasus_declare_computers() {
 pegasus_remove_modules() {
     former_modules=$(pegasus_modules) || return 1
     for module in $former_modules; do
-        [ "$module" = "$stays" ] || run cimprovider -r -m "$module" || return 1
+        [ "$module" = "$stays" ] || pegasus_remove_module "$module" || return 1
     done
+}
+
+# OpenPegasus does not remove a module that answers requests.
+pegasus_remove_module() { # MODULE
+    run cimprovider -r -m "$1" && return
+    case $told in
+    *"rovider is busy"*) complain "OpenPegasus: clients use $1: stop them, and begin again" ;;
+    esac
+    return 1
 }
 
 pegasus_load_provider() { # LIBRARY
@@ -146,7 +155,9 @@ pegasus_look_for_library() {
     directories=$(limited cimconfig -g providerDir 2>/dev/null) || return 0
     case $directories in
     *"$libraries"*) ;;
-    *) say "OpenPegasus may not find the library: set providerDir to a list with $libraries (cimconfig -p -s)" ;;
+    *)
+        say "OpenPegasus may not find the library: add $libraries to providerDir, with absolute names (cimconfig -c -p -s)"
+        ;;
     esac
 }
 
@@ -170,7 +181,7 @@ register_pegasus() {
     on_signal ''
     if pegasus_replace "$before"; then
         registered_with=$registered_with,pegasus
-        done_saying "OpenPegasus: registered $library"
+        done_saying "OpenPegasus: registered $library; it takes effect at once"
         pegasus_look_for_library
     else
         failed "OpenPegasus: not registered as it should be; now it has:"

@@ -166,11 +166,18 @@ sfcb_restart() {
     done_saying "SFCB: if its server is running, it takes effect when it is restarted"
 }
 
+# Prints a value of SFCB's configuration, in which the last line counts. Fails if the configuration cannot be read.
+sfcb_setting() { # NAME
+    [ -r "$sfcb_config" ] && sed -n "s/^[[:space:]]*$1:[[:space:]]*//p" "$sfcb_config" | tail -n 1
+}
+
 # A library is found by its name alone, in the directories that the configuration lists. Where it has no line for them,
 # SFCB looks in cmpi below the directory of its own libraries, among others.
 sfcb_look_for_library() {
-    [ -r "$sfcb_config" ] || return 0
-    directories=$(sed -n 's/^[[:space:]]*providerDirs:[[:space:]]*//p' "$sfcb_config" | tail -n 1)
+    directories=$(sfcb_setting providerDirs) || {
+        say "SFCB may not find the library: $sfcb_config cannot be read; its providerDirs has to name $libraries"
+        return
+    }
     case " $directories " in
     *" $libraries "*) ;;
     "  ")
@@ -181,6 +188,12 @@ sfcb_look_for_library() {
         ;;
     *) say "SFCB will not find the library: add $libraries to the line providerDirs in $sfcb_config" ;;
     esac
+}
+
+# SFCB trims values by default, and takes the bytes of characters outside of ASCII for white space. Clients see success.
+sfcb_look_for_trimming() {
+    sfcb_setting trimWhitespace | grep -qixE 'false([[:space:]].*)?' ||
+        say "SFCB trims values, also non-ASCII characters at their ends, unless $sfcb_config has trimWhitespace: false"
 }
 
 # Prints class and provider of each stanza that comes in.

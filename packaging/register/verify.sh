@@ -49,13 +49,17 @@ is_error() {
     printf '%s\n' "$1" | grep -q '^\* wbemcli: '
 }
 
-# Prints the classes that are registered here, if that can be known. Where both managers are installed, it is not known
-# which of them answers: it can be said of what is registered with both alike.
-registered_classes() {
+is_local() {
     case $server in
     localhost | localhost:* | 127.* | '[::1]'*) ;;
     *) return 1 ;;
     esac
+}
+
+# Prints the classes that are registered here, if that can be known. Where both managers are installed, it is not known
+# which of them answers: it can be said of what is registered with both alike.
+registered_classes() {
+    is_local || return 1
     with_sfcb='' with_pegasus=''
     [ "$sfcb" = no ] || with_sfcb=$(sfcb_registered_classes) || return 1
     [ "$pegasus" = no ] || with_pegasus=$(pegasus_registered_classes) || return 1
@@ -111,4 +115,5 @@ verify() {
     for class in $(all_classes); do
         verify_class "$class"
     done
+    [ "$sfcb" = no ] || ! is_local || sfcb_look_for_trimming
 }

@@ -5,7 +5,7 @@ begin "OpenPegasus: registers classes, then providers"
 machine "${pegasus[@]}"
 register register
 ends_with 0
-says "OpenPegasus: registered LeaseAndWarrantyGate"
+says "OpenPegasus: registered LeaseAndWarrantyGate; it takes effect at once"
 in_order '^cimmof -uc -n root/cimv2 [^ ]*/VELKO_ComputerSystem.mof$' \
     '^cimmof -uc -n root/cimv2 [^ ]*/VELKO_AssetIDDetails.mof$' '^cimmof -n root/PG_InterOp .*/pegasus/LeaseAndWarrantyGate.mof' \
     '^cimmof -n root/PG_InterOp .*/pegasus/OstrelComputerSystemProvider.mof'
@@ -126,6 +126,23 @@ ends_with 1
 says "not registered as it should be"
 says "module LeaseAndWarranty, provider LeaseAndWarrantyGate"
 says_nothing_of "module OstrelComputerSystem"
+
+begin "OpenPegasus: a module that answers requests is not removed, and the reason is said"
+machine "${pegasus[@]}"
+register register --provider bare
+touch "$STAND_IN/busy"
+for command in "register --provider gate" unregister; do
+    # shellcheck disable=SC2086 # several words
+    register $command
+    ends_with 1
+    says "OpenPegasus: clients use LeaseAndWarranty: stop them, and begin again"
+    module LeaseAndWarranty LeaseAndWarrantyProvider
+done
+rm "$STAND_IN/busy"
+register register --provider gate
+ends_with 0
+says_nothing_of "clients use"
+module LeaseAndWarranty LeaseAndWarrantyGate
 
 begin "OpenPegasus: a module that cannot be removed is not registered over"
 for calls in 4 5; do # to list them once more, to remove one
@@ -288,7 +305,7 @@ module LeaseAndWarranty LeaseAndWarrantyProvider
 begin "OpenPegasus: a provider directory that does not name the library's is a warning"
 machine "${pegasus[@]}"
 register register
-says "set providerDir to a list with $work/prefix/lib"
+says "add $work/prefix/lib to providerDir, with absolute names"
 echo "$work/prefix/lib" >"$STAND_IN/providerDir"
 register register
 says_nothing_of "providerDir"

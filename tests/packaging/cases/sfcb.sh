@@ -215,6 +215,12 @@ echo "providerDirs: /usr/lib $work/prefix/lib" >"$work/sfcb.cfg"
 register register
 says_nothing_of "providerDirs"
 
+begin "SFCB: a configuration that cannot be read is a warning"
+rm "$work/sfcb.cfg"
+register register
+ends_with 0
+says "$work/sfcb.cfg cannot be read; its providerDirs has to name $work/prefix/lib"
+
 begin "SFCB: a configuration that names no directories is a warning where SFCB would not look of itself"
 echo "httpPort: 5988" >"$work/sfcb.cfg"
 register register

@@ -97,6 +97,33 @@ ends_with 1
 register register --url http://host:5988
 ends_with 3
 
+begin "SFCB on this machine trims values unless its configuration says otherwise, which is a warning"
+machine "${sfcb[@]}" wbemcli
+for setting in none unreadable "trimWhitespace: true" "#trimWhitespace: false" \
+    $'trimWhitespace: false\ntrimWhitespace: true' "trimWhitespace: falsely"; do
+    case $setting in
+    none) echo "httpPort: 5988" >"$work/sfcb.cfg" ;;
+    unreadable) rm "$work/sfcb.cfg" ;;
+    *) echo "$setting" >"$work/sfcb.cfg" ;;
+    esac
+    register verify
+    ends_with 0
+    says "SFCB trims values"
+    says "unless $work/sfcb.cfg has trimWhitespace: false"
+done
+for setting in "trimWhitespace: false" "  trimWhitespace:	FALSE  " $'trimWhitespace: true\ntrimWhitespace:false'; do
+    echo "$setting" >"$work/sfcb.cfg"
+    register verify
+    ends_with 0
+    says_nothing_of "trim"
+done
+echo "trimWhitespace: true" >"$work/sfcb.cfg"
+register verify --url http://host:5988
+says_nothing_of "trim"
+machine "${sfcb[@]}" "${pegasus[@]}"
+register verify --manager pegasus
+says_nothing_of "trim"
+
 begin "A client that does not end is ended"
 machine "${sfcb[@]}" wbemcli
 touch "$STAND_IN/hang/wbemcli"
