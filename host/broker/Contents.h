@@ -35,12 +35,12 @@ struct ArrayContent {
     std::vector<Scalar> elements{};
 };
 
-/** Content of a CMPIEnumeration: elements of one type, the state that getNext gives them, and how many were taken. */
+/** Content of a CMPIEnumeration: elements of one type, how many were taken, and the state that getNext gives them. */
 struct EnumerationContent {
     CMPIType type = CMPI_null;
-    CMPIValueState state = CMPI_goodValue;
     std::vector<Scalar> elements{};
     std::size_t taken = 0;
+    CMPIValueState state = CMPI_goodValue;
 };
 
 /** Content of a CMPIArgs. */

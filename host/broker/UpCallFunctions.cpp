@@ -37,7 +37,7 @@ template <class Kind>
 CMPIEnumeration* enumerationOf(Broker& broker, CMPIType type, std::vector<Kind> values) {
     const bool isMarkedNull = broker.profile().marksElementsNull;
     EnumerationContent content{
-        type, static_cast<CMPIValueState>(isMarkedNull ? CMPI_nullValue : CMPI_goodValue), {}, 0};
+        type, {}, 0, static_cast<CMPIValueState>(isMarkedNull ? CMPI_nullValue : CMPI_goodValue)};
     content.elements.reserve(values.size());
     for (Kind& value : values) {
         content.elements.emplace_back(std::make_shared<const Kind>(std::move(value)));
