@@ -1,7 +1,6 @@
 #include "RecordStream.h"
 
 #include <algorithm>
-#include <cctype>
 #include <iterator>
 
 namespace KO::LeaseWarrantyProvider {
@@ -24,7 +23,8 @@ bool extractOrKeep(std::istream& stream, Value& value) {
 }  // namespace
 
 bool extract(std::istream& stream, unsigned int& number) {
-    if (std::isdigit((stream >> std::ws).peek()) == 0) {
+    // Stream extraction wraps a negative number around.
+    if ((stream >> std::ws).peek() == '-') {
         stream.setstate(std::ios::failbit);
     }
     return extractOrKeep(stream, number);

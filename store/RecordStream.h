@@ -12,7 +12,7 @@ namespace KO::LeaseWarrantyProvider {
  * Answers whether the field was there. Where it was not, the stream fails and the value stays as it was.
  */
 ///@{
-bool extract(std::istream& stream, unsigned int& number);  ///< decimal; a sign makes it no unsigned number
+bool extract(std::istream& stream, unsigned int& number);  ///< decimal, also as in "036" or "+36"; no minus sign
 bool extract(std::istream& stream, bool& flag);            ///< the number 0 or 1, also as in "01" or "+1"
 bool extract(std::istream& stream, std::string& word);     ///< up to the next white space
 ///@}

@@ -124,7 +124,7 @@ TEST_F(LeaseFile, TakesAFlagWithASignOrLeadingZeros) {
 }
 
 TEST_F(LeaseFile, StopsReadingAtWhatIsNoUnsignedNumber) {
-    for (const char* text : {"x", "-5", "+5", "-0", "4294967296", ".5", "*"}) {
+    for (const char* text : {"x", "-5", "-0", "+", "+-5", "++5", "+x", "+4294967296", "4294967296", ".5", "*"}) {
         SCOPED_TRACE(text);
         expectStopped(*load(damaged(3, text)), 0, 0);
     }

@@ -167,9 +167,31 @@ TYPED_TEST(Loading, TakesACountWithLeadingZerosAsDecimal) {
     EXPECT_EQ(this->identifiers(*this->load("012\n")).size(), 12U);
 }
 
+TYPED_TEST(Loading, ReadsACountWithAPlusSign) {
+    const auto cache = this->load("+2\n" + this->record("A") + this->record("B"));
+    EXPECT_THAT(this->identifiers(*cache), ElementsAre("A", "B"));
+}
+
+/** The next change writes back all that was read, so a sign that ended the reading would lose the records after it. */
+TYPED_TEST(Loading, ReadsANumberWithAPlusSignAndTheRecordsBehindIt) {
+    const auto sound = this->load("2\n" + this->record("A") + this->record("B"));
+    for (const auto& number : TypeParam::numbers()) {
+        auto lines = linesOf(this->record("A"));
+        lines.at(number.line) = "+36";
+        std::string content = "2\n";
+        for (const std::string& line : lines) {
+            content += line + "\n";
+        }
+        const auto cache = this->load(content + this->record("B"));
+        EXPECT_THAT(this->identifiers(*cache), ElementsAre("A", "B"));
+        EXPECT_EQ(cache->table[0].*number.member, 36U);
+        EXPECT_EQ(TypeParam::members(cache->table[1]), TypeParam::members(sound->table[1]));
+    }
+}
+
 TYPED_TEST(Loading, OfACountThatIsNoUnsignedNumberGivesAnEmptyTable) {
     for (const char* count :
-         {"-1", "+5", "-0", "x", "true", "*", "4294967296", "99999999999999999999999", "0x10", ".5"}) {
+         {"-1", "-0", "+", "+-1", "x", "true", "*", "4294967296", "99999999999999999999999", "0x10", ".5"}) {
         SCOPED_TRACE(count);
         this->expectEmpty(*this->load(count + std::string("\n") + this->record("A")));
     }

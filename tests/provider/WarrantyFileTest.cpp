@@ -35,7 +35,7 @@ TEST_F(WarrantyFile, HoldsFiveLinesForTheOnlyRecord) {
 }
 
 TEST_F(WarrantyFile, StopsReadingAtWhatIsNoUnsignedNumber) {
-    for (const char* text : {"x", "-5", "+5", "4294967296", "true"}) {
+    for (const char* text : {"x", "-5", "-0", "+", "+-5", "+4294967296", "4294967296", "true"}) {
         SCOPED_TRACE(text);
         const auto cache = load("2\nA\nAy\n20240101000000.000000+000\n" + std::string(text) +
                                 "\nB\nBee\n20250101000000.000000+000\n7\n");

@@ -67,7 +67,7 @@ private:
             return;
         }
         const bool isNegative = text[position] == '-';
-        position += form == Form::flag && (isNegative || text[position] == '+') ? 1 : 0;
+        position += isNegative || text[position] == '+' ? 1 : 0;
         const std::size_t end = std::min(text.find_first_not_of(digits, position), text.size());
         std::uint64_t number = 0;
         for (std::size_t at = position; at < end; ++at) {
@@ -76,7 +76,7 @@ private:
         const std::uint64_t largest = form == Form::number ? std::numeric_limits<std::uint32_t>::max()
                                       : isNegative         ? 0
                                                            : 1;
-        hasFailed = end == position || number > largest;
+        hasFailed = end == position || number > largest || (isNegative && form == Form::number);
         position = end;
         if (!hasFailed) {
             value = std::to_string(number);

@@ -140,8 +140,7 @@ TEST_P(DataFileTest, RecordsBeyondTheCountAreNotReadAndVanishAtTheNextChange) {
 }
 
 TEST_P(DataFileTest, ACountThatIsNoneMeansNoRecords) {
-    for (const char* count :
-         {"", "\n", "0\n", "0", "none\n", "-1\n", "+1\n", "99999999999999999999\n", ".5\n", "\xff\n"}) {
+    for (const char* count : {"", "\n", "0\n", "0", "none\n", "-1\n", "99999999999999999999\n", ".5\n", "\xff\n"}) {
         writeData(kind().dataFile, count + dataOfNew({"A"}).substr(2));
         EXPECT_THAT(identifiers(), IsEmpty()) << count;
         EXPECT_THAT(provider().deleteInstance(path("A")), isOk(0));
@@ -178,6 +177,17 @@ TEST_P(DataFileTest, ANumberThatIsNoneEndsTheReadingAndLaterRecordsRepeatWhatWas
     broken.replace(sound.find(number, second) + number.size(), 1, "many");
     writeData(kind().dataFile, broken);
     EXPECT_THAT(identifiers(), ElementsAre("A", "B", "B"));
+}
+
+TEST_P(DataFileTest, NumbersWithAPlusSignAreReadAndTheNextChangeWritesAllRecords) {
+    const std::string sound = dataOfNew({"A", "B"});
+    std::string signedNumbers = "+" + sound;
+    const std::string number = std::string(noDate) + "\n";
+    signedNumbers.insert(signedNumbers.find(number) + number.size(), "+");
+    writeData(kind().dataFile, signedNumbers);
+    EXPECT_THAT(identifiers(), ElementsAre("A", "B"));
+    createAll({"N"});
+    EXPECT_EQ(data(), dataOfNew({"A", "B", "N"}));
 }
 
 TEST_P(DataFileTest, AFileIsMadeForWhomTheUmaskLetsInAndKeepsItsMode) {
