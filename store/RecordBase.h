@@ -36,7 +36,7 @@ struct RecordStoreTexts {
 template <class Policy>
 class RecordCache : public Policy::Count {
 public:
-    /** Loads the file. Never fails: an absent or unreadable one gives an empty table and count 0. */
+    /** Loads the file. Never fails: a file that is absent, unreadable or too large gives an empty table and count 0. */
     RecordCache() noexcept;
     /** Releases the table. The file is not written. */
     ~RecordCache();
@@ -47,6 +47,10 @@ public:
     void flushCache();
 
     std::vector<typename Policy::Unit> table{};  ///< in file order, new records at the end, deleted ones included
+
+private:
+    /** Releases the records read so far and logs the reason. */
+    void abandonLoading(const CallSite& site, const char* reason) noexcept;
 };
 
 /**

@@ -10,6 +10,7 @@
 
 #include <algorithm>
 #include <exception>
+#include <new>
 
 namespace KO::LeaseWarrantyProvider {
 
@@ -17,6 +18,7 @@ namespace {
 constexpr const char* wrongTypeOrProperty = "Incorrect Type or Property";
 constexpr const char* wrongTypeOrPropertyOfNumber = "Incorrect Type or Property.";
 constexpr const char* wrongTypeOrReadOnly = "Incorrect Type or Property or Property is read-Only.";
+constexpr const char* recordsExceedMemory = "The records of the file do not fit into memory.";
 }  // namespace
 
 template <class Policy>
@@ -45,11 +47,18 @@ RecordCache<Policy>::RecordCache() noexcept {
     const Traced traced(at(Policy::unit, Level::flow, Policy::texts.cacheName));
     try {
         loadRecords(dataFilePath(Policy::texts.fileName), this->count(), table);
+    } catch (const std::bad_alloc&) {
+        abandonLoading(at(Policy::unit, Level::error, Policy::texts.cacheName), recordsExceedMemory);
     } catch (const std::exception& failure) {
-        this->count() = 0;
-        table.clear();
-        traceMessage(at(Policy::unit, Level::error, Policy::texts.cacheName), failure.what());
+        abandonLoading(at(Policy::unit, Level::error, Policy::texts.cacheName), failure.what());
     }
+}
+
+template <class Policy>
+void RecordCache<Policy>::abandonLoading(const CallSite& site, const char* reason) noexcept {
+    this->count() = 0;
+    std::vector<typename Policy::Unit>().swap(table);
+    traceMessage(site, reason);
 }
 
 template <class Policy>

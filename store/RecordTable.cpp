@@ -5,6 +5,8 @@
 
 #include <unistd.h>
 
+#include <new>
+
 namespace KO::LeaseWarrantyProvider {
 
 bool memoryCanHold(std::size_t count, std::size_t size) {
@@ -14,6 +16,12 @@ bool memoryCanHold(std::size_t count, std::size_t size) {
         return true;
     }
     return count <= static_cast<std::size_t>(pages) * static_cast<std::size_t>(pageSize) / size;
+}
+
+void requireMemory(std::size_t count, std::size_t size) {
+    if (!memoryCanHold(count, size)) {
+        throw std::bad_alloc();
+    }
 }
 
 std::string dataFilePath(const char* fileName) {

@@ -6,6 +6,7 @@
 #include <cstdio>
 #include <fstream>
 #include <locale>
+#include <new>
 #include <string>
 #include <vector>
 
@@ -15,10 +16,13 @@ namespace KO::LeaseWarrantyProvider {
 constexpr std::size_t reservedRecords = 10;
 
 /**
- * Whether this machine's physical memory could hold so many objects of a size at all; true when that
- * cannot be found out. What the process may use of it is not looked at.
+ * Whether a number of objects of a size fits into the physical memory of this machine; true when that is unknown.
+ * Limits of the process are not considered.
  */
 bool memoryCanHold(std::size_t count, std::size_t size);
+
+/** Throws std::bad_alloc when memory cannot hold the objects. */
+void requireMemory(std::size_t count, std::size_t size);
 
 /** The path of a file of the agent's data directory. */
 std::string dataFilePath(const char* fileName);
@@ -30,19 +34,9 @@ void openRecordFile(Stream& stream, const std::string& path, std::ios::openmode 
     stream.open(path, mode);
 }
 
-/**
- * Reads a record file into an empty table.
- *
- * The count at the head is believed: a shorter file yields the declared number of records, a missing
- * field keeping the value of the record before. Only a count whose records, or whose copies of the last one, the
- * machine's memory cannot hold, or that is no number, makes the file unreadable.
- *
- * @param count receives the number of records; left as it was, like the table, for an unreadable file
- * @throws std::bad_alloc when the process is refused the memory, std::ios_base::failure when the file cannot be read to
- *         its end; the table may then hold some records
- */
+/** loadRecords, with memory reserved for a multiple of the declared records if they are more than reservedRecords. */
 template <class Unit>
-void loadRecords(const std::string& path, unsigned int& count, std::vector<Unit>& table) {
+void readRecords(const std::string& path, unsigned int& count, std::vector<Unit>& table, std::size_t reserve) {
     table.reserve(reservedRecords);
     std::ifstream stream;
     openRecordFile(stream, path, std::ios::in);
@@ -54,12 +48,9 @@ void loadRecords(const std::string& path, unsigned int& count, std::vector<Unit>
     if (declared == 0) {
         return;
     }
-    const std::size_t room = std::size_t{2} * declared;
+    requireMemory(declared, sizeof(Unit));
     if (declared > reservedRecords) {
-        if (!memoryCanHold(room, sizeof(Unit))) {
-            return;
-        }
-        table.reserve(room);
+        table.reserve(reserve * declared);
     }
     stream.exceptions(std::ios::badbit);
     Unit scratch;
@@ -68,15 +59,33 @@ void loadRecords(const std::string& path, unsigned int& count, std::vector<Unit>
         stream >> scratch;
         if (!isAtEnd && !stream.good()) {  // from here on all are copies
             isAtEnd = true;
-            if (!memoryCanHold(declared - record, sizeof(Unit) + bytesOfTexts(scratch))) {
-                std::vector<Unit>().swap(table);
-                table.reserve(reservedRecords);
-                return;
-            }
+            requireMemory(declared - record, sizeof(Unit) + bytesOfTexts(scratch));
         }
         table.push_back(scratch);
     }
     count = declared;
+}
+
+/**
+ * Reads a record file into an empty table.
+ *
+ * The count at the head is believed: a shorter file yields the declared number of records, a missing
+ * field keeping the value of the record before. A count that is no number makes the file unreadable. Memory is
+ * reserved for twice the records, and only for the records where that is refused.
+ *
+ * @param count receives the number of records; unchanged, like the table, for an unreadable file
+ * @throws std::bad_alloc when memory cannot hold the declared records, or the copies of the last one among them, or
+ *         when the process is refused memory; std::ios_base::failure when the file cannot be read to its end. The
+ *         table may then hold some records
+ */
+template <class Unit>
+void loadRecords(const std::string& path, unsigned int& count, std::vector<Unit>& table) {
+    try {
+        readRecords(path, count, table, 2);
+    } catch (const std::bad_alloc&) {
+        std::vector<Unit>().swap(table);
+        readRecords(path, count, table, 1);
+    }
 }
 
 /**

@@ -212,7 +212,7 @@ TYPED_TEST(Loading, OfACountOfCopiesThatMemoryCannotHoldGivesAnEmptyTable) {
     write(this->path(), std::to_string(memory / length + 1) + "\n" + std::string(length, 'x'));
     typename TypeParam::Cache cache;
     this->expectEmpty(cache);
-    EXPECT_EQ(cache.table.capacity(), 10U);
+    EXPECT_LE(cache.table.capacity(), 10U);
 }
 
 TYPED_TEST(Loading, OfACountOfCopiesThatMemoryCanHoldGivesThemAll) {
