@@ -23,9 +23,15 @@ struct LeaseSettingClass {
     static Moniker elementMoniker(LeaseSetting& setting, Moniker& moniker) { return setting.getLeaseMoniker(moniker); }
 };
 
-/** The adapter of VELKO_LeaseSetting. */
-using CMPILeaseSetting = SettingAdapter<LeaseSettingClass>;
-
 extern template class SettingAdapter<LeaseSettingClass>;
+
+/** The adapter of VELKO_LeaseSetting. */
+class CMPILeaseSetting : public SettingAdapter<LeaseSettingClass> {
+public:
+    using SettingAdapter::SettingAdapter;
+
+    /** Path that a computer's lease would have; without keys if the computer's path has none. */
+    CMPIObjectPath* locateLease(const CMPIObjectPath* computerPath) { return locateElement(computerPath); }
+};
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -25,9 +25,15 @@ struct WarrantySettingClass {
     }
 };
 
-/** The adapter of VELKO_WarrantySetting. */
-using CMPIWarrantySetting = SettingAdapter<WarrantySettingClass>;
-
 extern template class SettingAdapter<WarrantySettingClass>;
+
+/** The adapter of VELKO_WarrantySetting. */
+class CMPIWarrantySetting : public SettingAdapter<WarrantySettingClass> {
+public:
+    using SettingAdapter::SettingAdapter;
+
+    /** Path that a computer's warranty would have; without keys if the computer's path has none. */
+    CMPIObjectPath* locateWarranty(const CMPIObjectPath* computerPath) { return locateElement(computerPath); }
+};
 
 }  // namespace KO::LeaseWarrantyProvider

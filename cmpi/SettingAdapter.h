@@ -21,7 +21,7 @@ namespace KO::LeaseWarrantyProvider {
  *   Element, Setting                    adapter of the lease or warranty, and element of the association
  *   associationClass, elementClass      the CIM classes
  *   associationClassId, elementClassId  their class ids
- *   constructor, destructor, locate     names in the log: of the latter, locateLease or locateWarranty
+ *   constructor, destructor, locate     names in the log; locateElement is traced as `locate`
  *   unit                                trace unit
  *   elementMoniker(setting, moniker)    the setting's way from computer to lease or warranty
  */
@@ -57,11 +57,12 @@ public:
     /** The current far end; null when there is none. */
     CMPIInstance* getAssociator(const char** properties);
 
-    /** Path that a computer's lease or warranty would have; without keys if the computer's path has none. */
-    CMPIObjectPath* locateElement(const CMPIObjectPath* computerPath);
-
     /** Path of the computer of a lease or warranty; without keys if that path has none. */
     CMPIObjectPath* locateComputer(const CMPIObjectPath* elementPath);
+
+protected:
+    /** Path that a computer's lease or warranty would have; without keys if the computer's path has none. */
+    CMPIObjectPath* locateElement(const CMPIObjectPath* computerPath);
 
 private:
     enum class Mode { computerSource, elementSource, associationList, inert };
