@@ -7,7 +7,6 @@
 #include <exception>
 #include <string>
 #include <tuple>
-#include <type_traits>
 #include <utility>
 
 /**
@@ -86,22 +85,11 @@ void writeLine(const CallSite& site, Format format) noexcept {
     }
 }
 
-/** How a value stands in a parameter list: enumerations as numbers, all else as its stream shows it. */
-template <class Value>
-decltype(auto) shown(const Value& value) {
-    if constexpr (std::is_enum_v<Value>) {
-        return static_cast<std::underlying_type_t<Value>>(value);
-    } else {
-        return (value);
-    }
-}
-
 /** A parameter list: labels, each followed by its value. */
 template <class... Parts>
 std::string parameterList(const Parts&... parts) {
     RZLog::RZMessageBuffer list;
-    std::ostream& stream = list;
-    ((stream << shown(parts)), ...);
+    ((list << parts), ...);
     return list.str(list);
 }
 

@@ -5,6 +5,7 @@
 #include <memory>
 #include <ostream>
 #include <string>
+#include <type_traits>
 
 namespace RZLog {
 
@@ -40,5 +41,19 @@ private:
     struct Implementation;
     std::unique_ptr<Implementation> implementation;
 };
+
+/**
+ * Appends a value that is no C string as the stream view shows it: a string as its characters, any other pointer as its
+ * address. An enumeration is appended as its number. @return the stream view, for inserting more
+ */
+template <class Value, class = std::enable_if_t<!std::is_convertible_v<const Value&, const char*>>>
+std::ostream& operator<<(RZMessageBuffer& buffer, const Value& value) {
+    std::ostream& stream = buffer;
+    if constexpr (std::is_enum_v<Value>) {
+        return stream << +static_cast<std::underlying_type_t<Value>>(value);
+    } else {
+        return stream << value;
+    }
+}
 
 }  // namespace RZLog
