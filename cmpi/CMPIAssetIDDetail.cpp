@@ -7,9 +7,9 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerCMPIAssetIDDetail = LoggerNames::kept(LoggerNames::provider);
+std::string loggerCMPIAssetIDDetail = LoggerNames::loggerName(LoggerNames::provider);
 
-const TraceUnit AssetClass::unit{loggerCMPIAssetIDDetail, "CMPIAssetIDDetail.cpp"};
+const TraceSource AssetAdapterTraits::traceSource{loggerCMPIAssetIDDetail, "CMPIAssetIDDetail.cpp"};
 
 namespace {
 
@@ -30,16 +30,16 @@ constexpr std::array<PairProperties, A::pairCount> pairProperties{{
 }};
 
 /** All ten properties of the pairs, or none unless there are exactly five. */
-void fillPairs(const A& details, Filling& filling, const char*) {
+void fillPairs(const A& details, InstanceBuilder& builder, const char*) {
     std::vector<A::PersonalizedPair> pairs;
     if (!details.getPersonalizedData(pairs) || pairs.size() != pairProperties.size()) {
         return;
     }
     for (std::size_t pair = 0; pair < pairs.size(); ++pair) {
-        filling.text = pairs[pair].first;
-        ProviderUtilities::setProperty(filling.instance, pairProperties[pair].label, filling.text);
-        filling.text = pairs[pair].second;
-        ProviderUtilities::setProperty(filling.instance, pairProperties[pair].data, filling.text);
+        builder.text = pairs[pair].first;
+        ProviderUtilities::setProperty(builder.instance, pairProperties[pair].label, builder.text);
+        builder.text = pairs[pair].second;
+        ProviderUtilities::setProperty(builder.instance, pairProperties[pair].data, builder.text);
     }
 }
 
@@ -95,7 +95,7 @@ void take(A& details, const CMPIInstance* instance, const Modification& modifica
 
 }  // namespace
 
-const std::array<KeyRow<A>, 4> AssetClass::keys{{
+const std::array<KeyRow<A>, 4> AssetAdapterTraits::keys{{
     key<A, &A::getIdentifyingNumber>("IdentifyingNumber"),
     key<A, &A::getName>("Name"),
     key<A, &A::getVendor>("Vendor"),
@@ -103,7 +103,7 @@ const std::array<KeyRow<A>, 4> AssetClass::keys{{
 }};
 
 /** Neither in the order of the keys nor in that of the types. */
-const std::array<KeyFilter<A>, 4> AssetClass::filters{{
+const std::array<KeyFilter<A>, 4> AssetAdapterTraits::filters{{
     {"Name", A::FILTER_NAME},
     {"IdentifyingNumber", A::FILTER_IDENTIFYING_NUMBER},
     {"Vendor", A::FILTER_VENDOR},
@@ -111,34 +111,34 @@ const std::array<KeyFilter<A>, 4> AssetClass::filters{{
 }};
 
 /** Changes are a table of their own, above: they are taken in another order than an instance is filled. */
-const std::array<PropertyRow<A>, 24> AssetClass::properties{{
-    filled<A, &A::getIdentifyingNumber>("IdentifyingNumber"),
-    filled<A, &A::getName, ValueForm::typed, Presence::always>("Name"),
-    filled<A, &A::getVendor, ValueForm::typed, Presence::always>("Vendor"),
-    filled<A, &A::getVersion>("Version"),
-    filled<A, &A::getCaption>("Caption"),
-    filled<A, &A::getDescription>("Description"),
-    filled<A, &A::getCSName, ValueForm::typed, Presence::always>("CSName"),
-    filled<A, &A::getPrimaryOwnerName>("PrimaryOwnerName"),
-    filled<A, &A::getPrimaryOwnerPhone>("PrimaryOwnerPhone"),
-    filled<A, &A::getPrimaryOwnerPosition>("PrimaryOwnerPosition"),
-    filled<A, &A::getPrimaryOwnerDepartment>("PrimaryOwnerDepartment"),
-    filled<A, &A::getAssetIDStringArea>("AssetIDStringArea"),
-    filled<A, &A::getAssetNumber>("AssetNumber"),
-    filled<A, &A::getAssetIdTag>("AssetIdTag"),
-    filled<A, &A::getProductName>("ProductName"),
+const std::array<PropertyRow<A>, 24> AssetAdapterTraits::properties{{
+    readOnly<A, &A::getIdentifyingNumber>("IdentifyingNumber"),
+    readOnly<A, &A::getName, ValueForm::typed, Presence::always>("Name"),
+    readOnly<A, &A::getVendor, ValueForm::typed, Presence::always>("Vendor"),
+    readOnly<A, &A::getVersion>("Version"),
+    readOnly<A, &A::getCaption>("Caption"),
+    readOnly<A, &A::getDescription>("Description"),
+    readOnly<A, &A::getCSName, ValueForm::typed, Presence::always>("CSName"),
+    readOnly<A, &A::getPrimaryOwnerName>("PrimaryOwnerName"),
+    readOnly<A, &A::getPrimaryOwnerPhone>("PrimaryOwnerPhone"),
+    readOnly<A, &A::getPrimaryOwnerPosition>("PrimaryOwnerPosition"),
+    readOnly<A, &A::getPrimaryOwnerDepartment>("PrimaryOwnerDepartment"),
+    readOnly<A, &A::getAssetIDStringArea>("AssetIDStringArea"),
+    readOnly<A, &A::getAssetNumber>("AssetNumber"),
+    readOnly<A, &A::getAssetIdTag>("AssetIdTag"),
+    readOnly<A, &A::getProductName>("ProductName"),
     {"PersonalizedLabel1", &fillPairs, nullptr},
-    filled<A, &A::getLastInventoried, ValueForm::dateTime>("LastInventoried"),
-    filled<A, &A::getPurchaseDate, ValueForm::dateTime>("PurchaseDate"),
-    filled<A, &A::getSystemLocation, ValueForm::text>("SystemLocation"),
-    filled<A, &A::getLocalDateTime, ValueForm::dateTime>("LocalDateTime"),
-    filled<A, &A::getZOPMProfile>("ZOPMProfile"),
-    filled<A, &A::getZOPMUpdateTime, ValueForm::dateTime>("ZOPMUpdateTime"),
-    filled<A, &A::getDeploymentProfile>("DeploymentProfile"),
-    filled<A, &A::getDeploymentUpdateTime, ValueForm::dateTime>("DeploymentUpdateTime"),
+    readOnly<A, &A::getLastInventoried, ValueForm::dateTime>("LastInventoried"),
+    readOnly<A, &A::getPurchaseDate, ValueForm::dateTime>("PurchaseDate"),
+    readOnly<A, &A::getSystemLocation, ValueForm::text>("SystemLocation"),
+    readOnly<A, &A::getLocalDateTime, ValueForm::dateTime>("LocalDateTime"),
+    readOnly<A, &A::getZOPMProfile>("ZOPMProfile"),
+    readOnly<A, &A::getZOPMUpdateTime, ValueForm::dateTime>("ZOPMUpdateTime"),
+    readOnly<A, &A::getDeploymentProfile>("DeploymentProfile"),
+    readOnly<A, &A::getDeploymentUpdateTime, ValueForm::dateTime>("DeploymentUpdateTime"),
 }};
 
-void AssetClass::modify(AssetIDDetails& details, const CMPIInstance* instance) {
+void AssetAdapterTraits::modify(AssetIDDetails& details, const CMPIInstance* instance) {
     take(details, instance, assetNumber);
     modifyPairs(details, instance);
     for (const Modification& modification : modifications) {
@@ -147,8 +147,8 @@ void AssetClass::modify(AssetIDDetails& details, const CMPIInstance* instance) {
     details.flushAssetData();
 }
 
-template class ElementAdapter<AssetClass>;
-template class ProductAdapter<AssetClass>;
-template void CMPIAssetIDDetail::modifyCMPIInstance<AssetClass>(const CMPIInstance*, const char**);
+template class ElementAdapter<AssetAdapterTraits>;
+template class ProductAdapter<AssetAdapterTraits>;
+template void CMPIAssetIDDetail::modifyCMPIInstance<AssetAdapterTraits>(const CMPIInstance*, const char**);
 
 }  // namespace KO::LeaseWarrantyProvider

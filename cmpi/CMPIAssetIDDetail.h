@@ -10,13 +10,13 @@
 namespace KO::LeaseWarrantyProvider {
 
 /** The CIM class VELKO_AssetIDDetails: what the design shared with VELKO_OstrelAgent needs to know of it. */
-struct AssetClass {
+struct AssetAdapterTraits {
     using Element = AssetIDDetails;
     static constexpr const char* className = "VELKO_AssetIDDetails";
     static constexpr const char* constructor = "CMPIAssetIDDetail";
     static constexpr const char* destructor = "~CMPIAssetIDDetail";
 
-    static const TraceUnit unit;
+    static const TraceSource traceSource;
     static const std::array<KeyRow<AssetIDDetails>, 4> keys;
     static const std::array<KeyFilter<AssetIDDetails>, 4> filters;
     static const std::array<PropertyRow<AssetIDDetails>, 24> properties;
@@ -29,10 +29,10 @@ struct AssetClass {
 };
 
 /** The adapter of VELKO_AssetIDDetails. */
-using CMPIAssetIDDetail = ProductAdapter<AssetClass>;
+using CMPIAssetIDDetail = ProductAdapter<AssetAdapterTraits>;
 
-extern template class ElementAdapter<AssetClass>;
-extern template class ProductAdapter<AssetClass>;
-extern template void CMPIAssetIDDetail::modifyCMPIInstance<AssetClass>(const CMPIInstance*, const char**);
+extern template class ElementAdapter<AssetAdapterTraits>;
+extern template class ProductAdapter<AssetAdapterTraits>;
+extern template void CMPIAssetIDDetail::modifyCMPIInstance<AssetAdapterTraits>(const CMPIInstance*, const char**);
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -1,6 +1,6 @@
 #include "CMPIComputerSystem.h"
 
-#include "Exceptions.h"
+#include "KO/Exceptions.h"
 #include "LoggerNames.h"
 #include "Trace.h"
 #include "cim/CmpiAccess.h"
@@ -11,22 +11,22 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerCMPILAWComputerSystem = LoggerNames::kept(LoggerNames::provider);
+std::string loggerCMPILAWComputerSystem = LoggerNames::loggerName(LoggerNames::provider);
 
 namespace {
 
-const TraceUnit unit{loggerCMPILAWComputerSystem, "CMPIComputerSystem.cpp"};
+const TraceSource traceSource{loggerCMPILAWComputerSystem, "CMPIComputerSystem.cpp"};
 
 }  // namespace
 
 CMPILAWComputerSystem::CMPILAWComputerSystem(const CMPIBroker* requestBroker, const CMPIContext* requestContext,
                                              std::string requestNameSpace)
     : broker(requestBroker), context(requestContext), nameSpace(std::move(requestNameSpace)) {
-    traceMethod(at(unit));
+    traceMethod(at(traceSource));
 }
 
 CMPILAWComputerSystem::~CMPILAWComputerSystem() {
-    traceMethod(at(unit));
+    traceMethod(at(traceSource));
 }
 
 bool CMPILAWComputerSystem::hasNext() const {
@@ -46,23 +46,23 @@ bool CMPILAWComputerSystem::takeNext() {
 }
 
 void CMPILAWComputerSystem::setObjectPath(const CMPIObjectPath* path) {
-    const Traced traced(at(unit, Level::error), label::objectPath, path);
+    const Traced traced(at(traceSource, Level::error), label::objectPath, path);
     CMPIStatus status{CMPI_RC_OK, nullptr};
     if (path != nullptr) {
         enumeration = broker->bft->enumerateInstances(broker, context, path, nullptr, &status);
     }
     if (status.rc != CMPI_RC_OK || !hasNext() || !takeNext()) {
-        fail<ProviderException>(at(unit), "Could not obtain an instance of Computer System");
+        fail<ProviderException>(at(traceSource), "Could not obtain an instance of Computer System");
     }
 }
 
 CMPILAWComputerSystem::operator bool() {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     return hasNext();
 }
 
 void CMPILAWComputerSystem::operator++() {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     current = nullptr;
     if (enumeration != nullptr) {
         takeNext();
@@ -70,7 +70,7 @@ void CMPILAWComputerSystem::operator++() {
 }
 
 CMPIObjectPath* CMPILAWComputerSystem::getObjectPath() {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     if (current == nullptr) {
         return nullptr;
     }
@@ -80,7 +80,7 @@ CMPIObjectPath* CMPILAWComputerSystem::getObjectPath() {
 }
 
 CMPIInstance* CMPILAWComputerSystem::getCMPIInstance(const char** properties) {
-    const Traced traced(at(unit, Level::error), label::properties, properties);
+    const Traced traced(at(traceSource, Level::error), label::properties, properties);
     return current;
 }
 

@@ -5,20 +5,20 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerCMPILease = LoggerNames::kept(LoggerNames::provider);
+std::string loggerCMPILease = LoggerNames::loggerName(LoggerNames::provider);
 
-const TraceUnit LeaseClass::unit{loggerCMPILease, "CMPILease.cpp"};
+const TraceSource LeaseAdapterTraits::traceSource{loggerCMPILease, "CMPILease.cpp"};
 
 using L = Lease;
 
 /** In the order in which an instance is filled. */
-const std::array<PropertyRow<L>, 18> LeaseClass::properties{{
-    filled<L, &L::getCaption>("Caption"),
-    filled<L, &L::getDescription>("Description"),
-    filled<L, &L::getInstanceID>("InstanceID"),
-    filled<L, &L::getElementName>("ElementName"),
-    filled<L, &L::getConfigurationName>("ConfigurationName"),
-    filled<L, &L::getChangeableType>("ChangeableType"),
+const std::array<PropertyRow<L>, 18> LeaseAdapterTraits::properties{{
+    readOnly<L, &L::getCaption>("Caption"),
+    readOnly<L, &L::getDescription>("Description"),
+    readOnly<L, &L::getInstanceID>("InstanceID"),
+    readOnly<L, &L::getElementName>("ElementName"),
+    readOnly<L, &L::getConfigurationName>("ConfigurationName"),
+    readOnly<L, &L::getChangeableType>("ChangeableType"),
     modifiable<L, &L::getLessor, &L::setLessor>("Lessor"),
     modifiable<L, &L::getBaseTermCommencementDate, &L::setBaseTermCommencementDate, ValueForm::dateTime>(
         "BaseTermCommencementDate"),
@@ -34,7 +34,7 @@ const std::array<PropertyRow<L>, 18> LeaseClass::properties{{
     modifiable<L, &L::getNetMonthlyLeaseRateFactor, &L::setNetMonthlyLeaseRateFactor>("NetMonthlyLeaseRateFactor"),
 }};
 
-template class ElementAdapter<LeaseClass>;
-template class RecordAdapter<LeaseClass>;
+template class ElementAdapter<LeaseAdapterTraits>;
+template class RecordAdapter<LeaseAdapterTraits>;
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -9,7 +9,7 @@
 namespace KO::LeaseWarrantyProvider {
 
 /** The CIM class VELKO_Lease: what the design shared with VELKO_Warranty needs to know of it. */
-struct LeaseClass {
+struct LeaseAdapterTraits {
     using Element = Lease;
     static constexpr const char* className = "VELKO_Lease";
     static constexpr const char* constructor = "CMPILease";
@@ -17,14 +17,14 @@ struct LeaseClass {
     static constexpr bool tracesCreation = true;
     static constexpr const char* modifyPropertiesLabel = " properties";
 
-    static const TraceUnit unit;
+    static const TraceSource traceSource;
     static const std::array<PropertyRow<Lease>, 18> properties;
 };
 
 /** The adapter of VELKO_Lease. */
-using CMPILease = RecordAdapter<LeaseClass>;
+using CMPILease = RecordAdapter<LeaseAdapterTraits>;
 
-extern template class ElementAdapter<LeaseClass>;
-extern template class RecordAdapter<LeaseClass>;
+extern template class ElementAdapter<LeaseAdapterTraits>;
+extern template class RecordAdapter<LeaseAdapterTraits>;
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -5,10 +5,10 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerCMPILeaseSetting = LoggerNames::kept(LoggerNames::provider);
+std::string loggerCMPILeaseSetting = LoggerNames::loggerName(LoggerNames::provider);
 
-const TraceUnit LeaseSettingClass::unit{loggerCMPILeaseSetting, "CMPILeaseSetting.cpp"};
+const TraceSource LeaseSettingAdapterTraits::traceSource{loggerCMPILeaseSetting, "CMPILeaseSetting.cpp"};
 
-template class SettingAdapter<LeaseSettingClass>;
+template class SettingAdapter<LeaseSettingAdapterTraits>;
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -8,7 +8,7 @@
 namespace KO::LeaseWarrantyProvider {
 
 /** The CIM class VELKO_LeaseSetting: what the shared design of the setting associations needs to know of it. */
-struct LeaseSettingClass {
+struct LeaseSettingAdapterTraits {
     using Element = CMPILease;
     using Setting = LeaseSetting;
     static constexpr const char* associationClass = "VELKO_LeaseSetting";
@@ -19,14 +19,14 @@ struct LeaseSettingClass {
     static constexpr const char* destructor = "~CMPILeaseSetting";
     static constexpr const char* locate = "locateLease";
 
-    static const TraceUnit unit;
+    static const TraceSource traceSource;
     static Moniker elementMoniker(LeaseSetting& setting, Moniker& moniker) { return setting.getLeaseMoniker(moniker); }
 };
 
-extern template class SettingAdapter<LeaseSettingClass>;
+extern template class SettingAdapter<LeaseSettingAdapterTraits>;
 
 /** The adapter of VELKO_LeaseSetting. */
-class CMPILeaseSetting : public SettingAdapter<LeaseSettingClass> {
+class CMPILeaseSetting : public SettingAdapter<LeaseSettingAdapterTraits> {
 public:
     using SettingAdapter::SettingAdapter;
 

@@ -5,13 +5,13 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerCMPIOstrelAgent = LoggerNames::kept(LoggerNames::provider);
+std::string loggerCMPIOstrelAgent = LoggerNames::loggerName(LoggerNames::provider);
 
-const TraceUnit AgentClass::unit{loggerCMPIOstrelAgent, "CMPIOstrelAgent.cpp"};
+const TraceSource AgentAdapterTraits::traceSource{loggerCMPIOstrelAgent, "CMPIOstrelAgent.cpp"};
 
 using A = OstrelAgent;
 
-const std::array<KeyRow<A>, 5> AgentClass::keys{{
+const std::array<KeyRow<A>, 5> AgentAdapterTraits::keys{{
     key<A, &A::getName>("Name"),
     key<A, &A::getIdentifyingNumber>("IdentifyingNumber"),
     key<A, &A::getProductName>("ProductName"),
@@ -20,7 +20,7 @@ const std::array<KeyRow<A>, 5> AgentClass::keys{{
 }};
 
 /** The order of the keys is not that of the types. */
-const std::array<KeyFilter<A>, 5> AgentClass::filters{{
+const std::array<KeyFilter<A>, 5> AgentAdapterTraits::filters{{
     {"Name", A::FILTER_NAME},
     {"IdentifyingNumber", A::FILTER_IDENTIFYING_NUMBER},
     {"ProductName", A::FILTER_PRODUCT_NAME},
@@ -28,19 +28,19 @@ const std::array<KeyFilter<A>, 5> AgentClass::filters{{
     {"Vendor", A::FILTER_VENDOR},
 }};
 
-const std::array<PropertyRow<A>, 9> AgentClass::properties{{
-    filled<A, &A::getCaption>("Caption"),
-    filled<A, &A::getDescription>("Description"),
-    filled<A, &A::getBuildNumber>("BuildNumber"),
-    filled<A, &A::getStatus>("Status"),
-    filled<A, &A::getName>("Name"),
-    filled<A, &A::getProductName>("ProductName"),
-    filled<A, &A::getIdentifyingNumber>("IdentifyingNumber"),
-    filled<A, &A::getVendor>("Vendor"),
-    filled<A, &A::getVersion>("Version"),
+const std::array<PropertyRow<A>, 9> AgentAdapterTraits::properties{{
+    readOnly<A, &A::getCaption>("Caption"),
+    readOnly<A, &A::getDescription>("Description"),
+    readOnly<A, &A::getBuildNumber>("BuildNumber"),
+    readOnly<A, &A::getStatus>("Status"),
+    readOnly<A, &A::getName>("Name"),
+    readOnly<A, &A::getProductName>("ProductName"),
+    readOnly<A, &A::getIdentifyingNumber>("IdentifyingNumber"),
+    readOnly<A, &A::getVendor>("Vendor"),
+    readOnly<A, &A::getVersion>("Version"),
 }};
 
-template class ElementAdapter<AgentClass>;
-template class ProductAdapter<AgentClass>;
+template class ElementAdapter<AgentAdapterTraits>;
+template class ProductAdapter<AgentAdapterTraits>;
 
 }  // namespace KO::LeaseWarrantyProvider

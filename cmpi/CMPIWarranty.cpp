@@ -5,26 +5,26 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerCMPIWarranty = LoggerNames::kept(LoggerNames::provider);
+std::string loggerCMPIWarranty = LoggerNames::loggerName(LoggerNames::provider);
 
-const TraceUnit WarrantyClass::unit{loggerCMPIWarranty, "CMPIWarranty.cpp"};
+const TraceSource WarrantyAdapterTraits::traceSource{loggerCMPIWarranty, "CMPIWarranty.cpp"};
 
 using W = Warranty;
 
 /** In the order in which an instance is filled. */
-const std::array<PropertyRow<W>, 9> WarrantyClass::properties{{
-    filled<W, &W::getCaption>("Caption"),
-    filled<W, &W::getDescription>("Description"),
-    filled<W, &W::getInstanceID>("InstanceID"),
-    filled<W, &W::getElementName>("ElementName"),
-    filled<W, &W::getConfigurationName>("ConfigurationName"),
-    filled<W, &W::getChangeableType>("ChangeableType"),
+const std::array<PropertyRow<W>, 9> WarrantyAdapterTraits::properties{{
+    readOnly<W, &W::getCaption>("Caption"),
+    readOnly<W, &W::getDescription>("Description"),
+    readOnly<W, &W::getInstanceID>("InstanceID"),
+    readOnly<W, &W::getElementName>("ElementName"),
+    readOnly<W, &W::getConfigurationName>("ConfigurationName"),
+    readOnly<W, &W::getChangeableType>("ChangeableType"),
     modifiable<W, &W::getCommencementDate, &W::setCommencementDate, ValueForm::dateTime>("WarrantyStartDate"),
     modifiable<W, &W::getDuration, &W::setDuration>("WarrantyDuration"),
     modifiable<W, &W::getWarrantor, &W::setWarrantor>("Warrantor"),
 }};
 
-template class ElementAdapter<WarrantyClass>;
-template class RecordAdapter<WarrantyClass>;
+template class ElementAdapter<WarrantyAdapterTraits>;
+template class RecordAdapter<WarrantyAdapterTraits>;
 
 }  // namespace KO::LeaseWarrantyProvider

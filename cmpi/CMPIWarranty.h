@@ -9,7 +9,7 @@
 namespace KO::LeaseWarrantyProvider {
 
 /** The CIM class VELKO_Warranty: what the design shared with VELKO_Lease needs to know of it. */
-struct WarrantyClass {
+struct WarrantyAdapterTraits {
     using Element = Warranty;
     static constexpr const char* className = "VELKO_Warranty";
     static constexpr const char* constructor = "CMPIWarranty";
@@ -17,14 +17,14 @@ struct WarrantyClass {
     static constexpr bool tracesCreation = false;
     static constexpr const char* modifyPropertiesLabel = " properties=";
 
-    static const TraceUnit unit;
+    static const TraceSource traceSource;
     static const std::array<PropertyRow<Warranty>, 9> properties;
 };
 
 /** The adapter of VELKO_Warranty. */
-using CMPIWarranty = RecordAdapter<WarrantyClass>;
+using CMPIWarranty = RecordAdapter<WarrantyAdapterTraits>;
 
-extern template class ElementAdapter<WarrantyClass>;
-extern template class RecordAdapter<WarrantyClass>;
+extern template class ElementAdapter<WarrantyAdapterTraits>;
+extern template class RecordAdapter<WarrantyAdapterTraits>;
 
 }  // namespace KO::LeaseWarrantyProvider

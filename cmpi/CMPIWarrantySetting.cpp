@@ -5,10 +5,10 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerCMPIWarrantySetting = LoggerNames::kept(LoggerNames::provider);
+std::string loggerCMPIWarrantySetting = LoggerNames::loggerName(LoggerNames::provider);
 
-const TraceUnit WarrantySettingClass::unit{loggerCMPIWarrantySetting, "CMPIWarrantySetting.cpp"};
+const TraceSource WarrantySettingAdapterTraits::traceSource{loggerCMPIWarrantySetting, "CMPIWarrantySetting.cpp"};
 
-template class SettingAdapter<WarrantySettingClass>;
+template class SettingAdapter<WarrantySettingAdapterTraits>;
 
 }  // namespace KO::LeaseWarrantyProvider

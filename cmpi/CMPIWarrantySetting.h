@@ -8,7 +8,7 @@
 namespace KO::LeaseWarrantyProvider {
 
 /** The CIM class VELKO_WarrantySetting: what the shared design of the setting associations needs to know of it. */
-struct WarrantySettingClass {
+struct WarrantySettingAdapterTraits {
     using Element = CMPIWarranty;
     using Setting = WarrantySetting;
     static constexpr const char* associationClass = "VELKO_WarrantySetting";
@@ -19,16 +19,16 @@ struct WarrantySettingClass {
     static constexpr const char* destructor = "~CMPIWarrantySetting";
     static constexpr const char* locate = "locateWarranty";
 
-    static const TraceUnit unit;
+    static const TraceSource traceSource;
     static Moniker elementMoniker(WarrantySetting& setting, Moniker& moniker) {
         return setting.getWarrantyMoniker(moniker);
     }
 };
 
-extern template class SettingAdapter<WarrantySettingClass>;
+extern template class SettingAdapter<WarrantySettingAdapterTraits>;
 
 /** The adapter of VELKO_WarrantySetting. */
-class CMPIWarrantySetting : public SettingAdapter<WarrantySettingClass> {
+class CMPIWarrantySetting : public SettingAdapter<WarrantySettingAdapterTraits> {
 public:
     using SettingAdapter::SettingAdapter;
 

@@ -10,9 +10,9 @@ namespace KO::LeaseWarrantyProvider {
  * What the adapters over one managed element have in common: they hold the element, and stand where it
  * stands. Base of RecordAdapter and ProductAdapter.
  *
- * Policy gives Element, unit, and the constructor's and destructor's names in the log.
+ * Traits gives Element, traceSource, and the constructor's and destructor's names in the log.
  */
-template <class Policy>
+template <class Traits>
 class ElementAdapter {
 public:
     /** Stands on the first of all that the element has. */
@@ -30,7 +30,7 @@ public:
     void operator++();
 
 protected:
-    using Element = typename Policy::Element;
+    using Element = typename Traits::Element;
 
     /** Stands on the first of what the path's keys select: narrow makes filters of the element of them. */
     ElementAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext, const CMPIObjectPath* path,

@@ -11,38 +11,38 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-template <class Policy>
-ElementAdapter<Policy>::ElementAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext,
+template <class Traits>
+ElementAdapter<Traits>::ElementAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext,
                                        std::string requestNameSpace)
     : broker(requestBroker), context(requestContext), nameSpace(std::move(requestNameSpace)) {
-    const Traced traced(at(Policy::unit, Level::flow, Policy::constructor), label::broker, broker, label::context,
-                        context);
+    const Traced traced(at(Traits::traceSource, Level::flow, Traits::constructor), label::broker, broker,
+                        label::context, context);
 }
 
-template <class Policy>
-ElementAdapter<Policy>::ElementAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext,
+template <class Traits>
+ElementAdapter<Traits>::ElementAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext,
                                        const CMPIObjectPath* path,
                                        void (*narrow)(Element& element, const CMPIObjectPath* path))
     : broker(requestBroker), context(requestContext), nameSpace(ProviderUtilities::getNamespace(path)) {
-    const Traced traced(at(Policy::unit, Level::flow, Policy::constructor), label::broker, broker, label::context,
-                        context, label::objectPath, path);
+    const Traced traced(at(Traits::traceSource, Level::flow, Traits::constructor), label::broker, broker,
+                        label::context, context, label::objectPath, path);
     narrow(element, path);
 }
 
-template <class Policy>
-ElementAdapter<Policy>::~ElementAdapter() noexcept(false) {
-    const Traced traced(at(Policy::unit, Level::flow, Policy::destructor));
+template <class Traits>
+ElementAdapter<Traits>::~ElementAdapter() noexcept(false) {
+    const Traced traced(at(Traits::traceSource, Level::flow, Traits::destructor));
 }
 
-template <class Policy>
-ElementAdapter<Policy>::operator bool() {
-    const Traced traced(at(Policy::unit));
+template <class Traits>
+ElementAdapter<Traits>::operator bool() {
+    const Traced traced(at(Traits::traceSource));
     return element;
 }
 
-template <class Policy>
-void ElementAdapter<Policy>::operator++() {
-    const Traced traced(at(Policy::unit));
+template <class Traits>
+void ElementAdapter<Traits>::operator++() {
+    const Traced traced(at(Traits::traceSource));
     ++element;
 }
 

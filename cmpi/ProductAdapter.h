@@ -36,20 +36,20 @@ struct KeyFilter {
  * vendor and version: the design that CMPIOstrelAgent and CMPIAssetIDDetail share. It stands where
  * its element stands.
  *
- * Policy gives:
+ * Traits gives:
  *   Element              the managed element
  *   className            the CIM class
  *   constructor, destructor   their names in the log
- *   unit                 trace unit
+ *   traceSource          trace source
  *   keys                 table of KeyRow, in the order in which a path carries them
  *   filters              table of KeyFilter, in the order in which a path's keys are looked at
  *   properties           table of PropertyRow, in the order in which an instance is filled
  *   modify(element, instance)   of a class that can be modified
  */
-template <class Policy>
-class ProductAdapter : public ElementAdapter<Policy> {
+template <class Traits>
+class ProductAdapter : public ElementAdapter<Traits> {
 public:
-    using ElementAdapter<Policy>::ElementAdapter;
+    using ElementAdapter<Traits>::ElementAdapter;
 
     /** What the path's keys select, or all if it has none. May throw what the element's filters throw. */
     ProductAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext, const CMPIObjectPath* path);
@@ -67,15 +67,15 @@ public:
     CMPIInstance* getCMPIInstance(const char** properties);
 
     /** Writes the instance's modifiable properties; a null instance changes nothing. */
-    template <class ModifiablePolicy = Policy>
+    template <class ModifiablePolicy = Traits>
     void modifyCMPIInstance(const CMPIInstance* referenceInstance, const char** properties);
 
 private:
-    using ElementAdapter<Policy>::broker;
-    using ElementAdapter<Policy>::nameSpace;
-    using ElementAdapter<Policy>::element;
+    using ElementAdapter<Traits>::broker;
+    using ElementAdapter<Traits>::nameSpace;
+    using ElementAdapter<Traits>::element;
 
-    static void narrow(typename Policy::Element& element, const CMPIObjectPath* path);
+    static void narrow(typename Traits::Element& element, const CMPIObjectPath* path);
 };
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -17,62 +17,62 @@ namespace {
 constexpr const char* keyValueName = "l_keyValue";
 }  // namespace
 
-template <class Policy>
-ProductAdapter<Policy>::ProductAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext,
+template <class Traits>
+ProductAdapter<Traits>::ProductAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext,
                                        const CMPIObjectPath* path)
-    : ElementAdapter<Policy>(requestBroker, requestContext, path, &narrow) {}
+    : ElementAdapter<Traits>(requestBroker, requestContext, path, &narrow) {}
 
-template <class Policy>
-void ProductAdapter<Policy>::setObjectPath(const CMPIObjectPath* path) {
+template <class Traits>
+void ProductAdapter<Traits>::setObjectPath(const CMPIObjectPath* path) {
     narrow(element, path);
 }
 
-template <class Policy>
-void ProductAdapter<Policy>::narrow(typename Policy::Element& element, const CMPIObjectPath* path) {
-    const Traced traced(at(Policy::unit, Level::flow, "setObjectPath"));
+template <class Traits>
+void ProductAdapter<Traits>::narrow(typename Traits::Element& element, const CMPIObjectPath* path) {
+    const Traced traced(at(Traits::traceSource, Level::flow, "setObjectPath"));
     if (ProviderUtilities::getKeyCount(path) == 0) {
         return;
     }
-    for (const auto& filter : Policy::filters) {
+    for (const auto& filter : Traits::filters) {
         std::string value;
         if (ProviderUtilities::getKeyProperty(path, filter.name, value)) {
-            traceVariable(at(Policy::unit, Level::flow, "setObjectPath"), keyValueName, value);
+            traceVariable(at(Traits::traceSource, Level::flow, "setObjectPath"), keyValueName, value);
             element.setFilter(filter.type, value);
         }
     }
 }
 
-template <class Policy>
-CMPIObjectPath* ProductAdapter<Policy>::getObjectPath() {
-    const Traced traced(at(Policy::unit));
-    CMPIObjectPath* path = ProviderUtilities::createObjectPath(broker, Policy::className, nameSpace);
+template <class Traits>
+CMPIObjectPath* ProductAdapter<Traits>::getObjectPath() {
+    const Traced traced(at(Traits::traceSource));
+    CMPIObjectPath* path = ProviderUtilities::createObjectPath(broker, Traits::className, nameSpace);
     if (path == nullptr) {
         return nullptr;
     }
     std::string value;
-    for (const auto& key : Policy::keys) {
+    for (const auto& key : Traits::keys) {
         key.read(element, value);
-        traceVariable(at(Policy::unit), keyValueName, value);
+        traceVariable(at(Traits::traceSource), keyValueName, value);
         ProviderUtilities::setKeyProperty(path, key.name, value);
     }
     return path;
 }
 
-template <class Policy>
-CMPIInstance* ProductAdapter<Policy>::getCMPIInstance(const char** properties) {
-    const Traced traced(at(Policy::unit), label::properties, properties);
+template <class Traits>
+CMPIInstance* ProductAdapter<Traits>::getCMPIInstance(const char** properties) {
+    const Traced traced(at(Traits::traceSource), label::properties, properties);
     CMPIInstance* instance = ProviderUtilities::createInstance(broker, getObjectPath());
     if (instance != nullptr) {
-        fillInstance(Policy::properties, element, broker, instance);
+        fillInstance(Traits::properties, element, broker, instance);
     }
     return instance;
 }
 
-template <class Policy>
+template <class Traits>
 template <class ModifiablePolicy>
-void ProductAdapter<Policy>::modifyCMPIInstance(const CMPIInstance* referenceInstance, const char** properties) {
+void ProductAdapter<Traits>::modifyCMPIInstance(const CMPIInstance* referenceInstance, const char** properties) {
     // Named here, since the compiler's name of a function template carries its argument.
-    const Traced traced(at(Policy::unit, Level::flow, "modifyCMPIInstance"), label::referenceInstance,
+    const Traced traced(at(Traits::traceSource, Level::flow, "modifyCMPIInstance"), label::referenceInstance,
                         referenceInstance, label::propertiesBare, properties);
     if (referenceInstance != nullptr) {
         ModifiablePolicy::modify(element, referenceInstance);

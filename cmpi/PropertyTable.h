@@ -8,7 +8,7 @@
 namespace KO::LeaseWarrantyProvider {
 
 /** An instance being filled from an element. The text serves one string property after the other. */
-struct Filling {
+struct InstanceBuilder {
     const CMPIBroker* broker;
     CMPIInstance* instance;
     std::string text{};
@@ -16,14 +16,14 @@ struct Filling {
 
 /**
  * One property of a CIM class. The rows of a class stand in the order in which its instances are
- * filled; they drive filling and, where it keeps that order, modification.
+ * filled; they drive builder and, where it keeps that order, modification.
  */
 template <class Element>
 struct PropertyRow {
     const char* name;
 
     /** Sets the property from the element. */
-    void (*fill)(const Element& element, Filling& filling, const char* name);
+    void (*fill)(const Element& element, InstanceBuilder& builder, const char* name);
 
     /** Changes the element from the instance, if the instance has the property. Null: not by this row. */
     void (*modify)(Element& element, const CMPIInstance* instance, const char* name);
@@ -38,7 +38,7 @@ enum class ValueForm {
 
 /** Whether a property is set when the getter answers that there is no value: with what the text held before. */
 enum class Presence {
-    whenAnswered,
+    ifAvailable,
     always,
 };
 
@@ -73,24 +73,24 @@ template <auto getter>
 using Traits = GetterTraits<decltype(getter)>;
 
 template <ValueForm form, class Value>
-void set(const Filling& filling, const char* name, Value& value) {
+void set(const InstanceBuilder& builder, const char* name, Value& value) {
     if constexpr (form == ValueForm::typed) {
-        ProviderUtilities::setProperty(filling.instance, name, value);
+        ProviderUtilities::setProperty(builder.instance, name, value);
     } else {
-        ProviderUtilities::setProperty(filling.broker, filling.instance, name, value, form == ValueForm::dateTime);
+        ProviderUtilities::setProperty(builder.broker, builder.instance, name, value, form == ValueForm::dateTime);
     }
 }
 
 template <class Element, auto getter, ValueForm form, Presence presence>
-void fill(const Element& element, Filling& filling, const char* name) {
+void fill(const Element& element, InstanceBuilder& builder, const char* name) {
     using Value = typename Traits<getter>::Value;
     const auto fillFrom = [&](Value& value) {
         if (Traits<getter>::get(element, getter, value) || presence == Presence::always) {
-            set<form>(filling, name, value);
+            set<form>(builder, name, value);
         }
     };
     if constexpr (std::is_same_v<Value, std::string>) {
-        fillFrom(filling.text);
+        fillFrom(builder.text);
     } else {
         Value value{};
         fillFrom(value);
@@ -115,24 +115,24 @@ void modify(Element& element, const CMPIInstance* instance, const char* name) {
 }  // namespace PropertyTableDetail
 
 /** The row of a property that is only filled: a read-only one, or one whose changes the class takes in another way. */
-template <class Element, auto getter, ValueForm form = ValueForm::typed, Presence presence = Presence::whenAnswered>
-constexpr PropertyRow<Element> filled(const char* name) {
+template <class Element, auto getter, ValueForm form = ValueForm::typed, Presence presence = Presence::ifAvailable>
+constexpr PropertyRow<Element> readOnly(const char* name) {
     return {name, &PropertyTableDetail::fill<Element, getter, form, presence>, nullptr};
 }
 
 /** The row of a property that a client may change. */
 template <class Element, auto getter, auto setter, ValueForm form = ValueForm::typed>
 constexpr PropertyRow<Element> modifiable(const char* name) {
-    return {name, &PropertyTableDetail::fill<Element, getter, form, Presence::whenAnswered>,
+    return {name, &PropertyTableDetail::fill<Element, getter, form, Presence::ifAvailable>,
             &PropertyTableDetail::modify<Element, getter, setter>};
 }
 
 /** Fills an instance from an element, row by row. */
 template <class Rows, class Element>
 void fillInstance(const Rows& rows, const Element& element, const CMPIBroker* broker, CMPIInstance* instance) {
-    Filling filling{broker, instance};
+    InstanceBuilder builder{broker, instance};
     for (const auto& row : rows) {
-        row.fill(element, filling, row.name);
+        row.fill(element, builder, row.name);
     }
 }
 

@@ -10,19 +10,19 @@ namespace KO::LeaseWarrantyProvider {
  * The adapter of a CIM class whose instances are records with the one key "InstanceID": the design
  * that CMPILease and CMPIWarranty share. It stands where its element stands.
  *
- * Policy gives:
+ * Traits gives:
  *   Element                      the managed element
  *   className                    the CIM class
  *   constructor, destructor      their names in the log
  *   tracesCreation               whether a creation's result is traced
  *   modifyPropertiesLabel        label of the property list in the trace of a modification
- *   unit, properties             trace unit and table of PropertyRow of the class
+ *   traceSource, properties      trace source and table of PropertyRow of the class
  */
-template <class Policy>
-class RecordAdapter : public ElementAdapter<Policy> {
+template <class Traits>
+class RecordAdapter : public ElementAdapter<Traits> {
 public:
     /** For creation, and as the end of an association: all records. */
-    using ElementAdapter<Policy>::ElementAdapter;
+    using ElementAdapter<Traits>::ElementAdapter;
 
     /**
      * For every other request: the record that the path's key names, or all if it has no key that can be
@@ -57,11 +57,11 @@ public:
     void deleteCMPIInstance();
 
 private:
-    using ElementAdapter<Policy>::broker;
-    using ElementAdapter<Policy>::nameSpace;
-    using ElementAdapter<Policy>::element;
+    using ElementAdapter<Traits>::broker;
+    using ElementAdapter<Traits>::nameSpace;
+    using ElementAdapter<Traits>::element;
 
-    static void narrow(typename Policy::Element& element, const CMPIObjectPath* path);
+    static void narrow(typename Traits::Element& element, const CMPIObjectPath* path);
 };
 
 }  // namespace KO::LeaseWarrantyProvider

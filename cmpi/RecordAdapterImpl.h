@@ -39,31 +39,31 @@ std::optional<std::string> stringKey(const CMPIObjectPath* path, const char* nam
 
 }  // namespace
 
-template <class Policy>
-RecordAdapter<Policy>::RecordAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext,
+template <class Traits>
+RecordAdapter<Traits>::RecordAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext,
                                      const CMPIObjectPath* path)
-    : ElementAdapter<Policy>(requestBroker, requestContext, path, &narrow) {}
+    : ElementAdapter<Traits>(requestBroker, requestContext, path, &narrow) {}
 
-template <class Policy>
-void RecordAdapter<Policy>::setObjectPath(const CMPIObjectPath* path) {
+template <class Traits>
+void RecordAdapter<Traits>::setObjectPath(const CMPIObjectPath* path) {
     narrow(element, path);
 }
 
-template <class Policy>
-void RecordAdapter<Policy>::narrow(typename Policy::Element& element, const CMPIObjectPath* path) {
-    const Traced traced(at(Policy::unit, Level::flow, "setObjectPath"), label::objectPath, path);
+template <class Traits>
+void RecordAdapter<Traits>::narrow(typename Traits::Element& element, const CMPIObjectPath* path) {
+    const Traced traced(at(Traits::traceSource, Level::flow, "setObjectPath"), label::objectPath, path);
     if (ProviderUtilities::getKeyCount(path) == 0) {
         return;
     }
     if (const auto instanceId = stringKey(path, instanceIdKey)) {
-        element.setFilter(Policy::Element::InstanceIDFilter, *instanceId);
+        element.setFilter(Traits::Element::InstanceIDFilter, *instanceId);
     }
 }
 
-template <class Policy>
-CMPIObjectPath* RecordAdapter<Policy>::getObjectPath() {
-    const Traced traced(at(Policy::unit));
-    CMPIObjectPath* path = ProviderUtilities::createObjectPath(broker, Policy::className, nameSpace);
+template <class Traits>
+CMPIObjectPath* RecordAdapter<Traits>::getObjectPath() {
+    const Traced traced(at(Traits::traceSource));
+    CMPIObjectPath* path = ProviderUtilities::createObjectPath(broker, Traits::className, nameSpace);
     std::string instanceId;
     if (path != nullptr && element && element.getInstanceID(instanceId)) {
         ProviderUtilities::setKeyProperty(path, instanceIdKey, instanceId);
@@ -71,22 +71,22 @@ CMPIObjectPath* RecordAdapter<Policy>::getObjectPath() {
     return path;
 }
 
-template <class Policy>
-CMPIInstance* RecordAdapter<Policy>::getCMPIInstance(const char** properties) {
-    const Traced traced(at(Policy::unit), label::properties, properties);
+template <class Traits>
+CMPIInstance* RecordAdapter<Traits>::getCMPIInstance(const char** properties) {
+    const Traced traced(at(Traits::traceSource), label::properties, properties);
     CMPIInstance* instance = ProviderUtilities::createInstance(broker, getObjectPath());
     if (instance != nullptr) {
-        fillInstance(Policy::properties, element, broker, instance);
+        fillInstance(Traits::properties, element, broker, instance);
     }
     return instance;
 }
 
-template <class Policy>
-CMPIInstance* RecordAdapter<Policy>::createCMPIInstance(const CMPIObjectPath* desiredObjectPath) {
-    const Traced traced(at(Policy::unit), label::desiredObjectPath, desiredObjectPath);
+template <class Traits>
+CMPIInstance* RecordAdapter<Traits>::createCMPIInstance(const CMPIObjectPath* desiredObjectPath) {
+    const Traced traced(at(Traits::traceSource), label::desiredObjectPath, desiredObjectPath);
     std::string instanceId;
     const bool found = ProviderUtilities::getKeyProperty(desiredObjectPath, instanceIdKey, instanceId);
-    traceVariable(at(Policy::unit), "instanceId", instanceId);
+    traceVariable(at(Traits::traceSource), "instanceId", instanceId);
 
     // Asked for at each creation, although nothing in the record depends on it.
     Instrumentation instrumentation;
@@ -95,31 +95,31 @@ CMPIInstance* RecordAdapter<Policy>::createCMPIInstance(const CMPIObjectPath* de
     if (!found || !element.create(instanceId)) {
         return nullptr;
     }
-    if constexpr (Policy::tracesCreation) {
-        traceVariable(at(Policy::unit), "Instance Created", 1U);
+    if constexpr (Traits::tracesCreation) {
+        traceVariable(at(Traits::traceSource), "Instance Created", 1U);
     }
     setObjectPath(desiredObjectPath);
     return getCMPIInstance(nullptr);
 }
 
-template <class Policy>
-void RecordAdapter<Policy>::modifyCMPIInstance(const CMPIInstance* referenceInstance, const char** properties) {
-    const Traced traced(at(Policy::unit), Policy::modifyPropertiesLabel, properties, label::referenceInstance,
+template <class Traits>
+void RecordAdapter<Traits>::modifyCMPIInstance(const CMPIInstance* referenceInstance, const char** properties) {
+    const Traced traced(at(Traits::traceSource), Traits::modifyPropertiesLabel, properties, label::referenceInstance,
                         referenceInstance);
     if (referenceInstance == nullptr) {
         return;
     }
-    for (const auto& row : Policy::properties) {
+    for (const auto& row : Traits::properties) {
         if (row.modify != nullptr) {
             row.modify(element, referenceInstance, row.name);
         }
     }
 }
 
-template <class Policy>
-void RecordAdapter<Policy>::deleteCMPIInstance() {
+template <class Traits>
+void RecordAdapter<Traits>::deleteCMPIInstance() {
     CMPIInstance* instance = nullptr;
-    const Traced traced(at(Policy::unit), label::instance, instance);
+    const Traced traced(at(Traits::traceSource), label::instance, instance);
     instance = getCMPIInstance(nullptr);
     element.remove();
 }

@@ -17,15 +17,15 @@ namespace KO::LeaseWarrantyProvider {
  * keys. Of the lease or warranty: all computers that the object manager knows but the last, whichever of
  * them it belongs to. With a path of any other class it yields nothing.
  *
- * Policy gives:
+ * Traits gives:
  *   Element, Setting                    adapter of the lease or warranty, and element of the association
  *   associationClass, elementClass      the CIM classes
  *   associationClassId, elementClassId  their class ids
  *   constructor, destructor, locate     names in the log; locateElement is traced as `locate`
- *   unit                                trace unit
+ *   traceSource                         trace source
  *   elementMoniker(setting, moniker)    the setting's way from computer to lease or warranty
  */
-template <class Policy>
+template <class Traits>
 class SettingAdapter {
 public:
     /** Positioned by the path's class. May throw what its parts throw, as when there is no computer system. */
@@ -78,8 +78,8 @@ private:
     std::string nameSpace;
     unsigned int requestedClassId = 0;
     CMPILAWComputerSystem computer;
-    typename Policy::Element element;
-    typename Policy::Setting setting{};
+    typename Traits::Element element;
+    typename Traits::Setting setting{};
 };
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -19,42 +19,42 @@ constexpr const char* elementRole = "Dependent";
 
 }  // namespace
 
-template <class Policy>
-SettingAdapter<Policy>::SettingAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext,
+template <class Traits>
+SettingAdapter<Traits>::SettingAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext,
                                        const CMPIObjectPath* path)
     : broker(requestBroker),
       context(requestContext),
       nameSpace(ProviderUtilities::getNamespace(path)),
       computer(broker, context, nameSpace),
       element(broker, context, nameSpace) {
-    const Traced traced(at(Policy::unit, Level::error, Policy::constructor), label::broker, broker, label::context,
-                        context, label::objectPath, path);
+    const Traced traced(at(Traits::traceSource, Level::error, Traits::constructor), label::broker, broker,
+                        label::context, context, label::objectPath, path);
     requestedClassId = ProviderUtilities::getClassId(path);
-    traceVariable(at(Policy::unit, Level::flow, Policy::constructor), "requestedClassId", requestedClassId);
+    traceVariable(at(Traits::traceSource, Level::flow, Traits::constructor), "requestedClassId", requestedClassId);
     position(path);
 }
 
-template <class Policy>
-SettingAdapter<Policy>::~SettingAdapter() noexcept(false) {
-    traceMethod(at(Policy::unit, Level::flow, Policy::destructor));
+template <class Traits>
+SettingAdapter<Traits>::~SettingAdapter() noexcept(false) {
+    traceMethod(at(Traits::traceSource, Level::flow, Traits::destructor));
 }
 
-template <class Policy>
-typename SettingAdapter<Policy>::Mode SettingAdapter<Policy>::mode() const {
+template <class Traits>
+typename SettingAdapter<Traits>::Mode SettingAdapter<Traits>::mode() const {
     switch (requestedClassId) {
         case ClassId::computerSystem:
             return Mode::computerSource;
-        case Policy::elementClassId:
+        case Traits::elementClassId:
             return Mode::elementSource;
-        case Policy::associationClassId:
+        case Traits::associationClassId:
             return Mode::associationList;
         default:
             return Mode::inert;
     }
 }
 
-template <class Policy>
-void SettingAdapter<Policy>::position(const CMPIObjectPath* path) {
+template <class Traits>
+void SettingAdapter<Traits>::position(const CMPIObjectPath* path) {
     switch (mode()) {
         case Mode::elementSource:
             computer.setObjectPath(locateComputer(path));
@@ -70,9 +70,9 @@ void SettingAdapter<Policy>::position(const CMPIObjectPath* path) {
     }
 }
 
-template <class Policy>
-SettingAdapter<Policy>::operator bool() {
-    const Traced traced(at(Policy::unit));
+template <class Traits>
+SettingAdapter<Traits>::operator bool() {
+    const Traced traced(at(Traits::traceSource));
     switch (mode()) {
         case Mode::elementSource:
             return computer;
@@ -86,9 +86,9 @@ SettingAdapter<Policy>::operator bool() {
     return false;
 }
 
-template <class Policy>
-void SettingAdapter<Policy>::operator++() {
-    const Traced traced(at(Policy::unit));
+template <class Traits>
+void SettingAdapter<Traits>::operator++() {
+    const Traced traced(at(Traits::traceSource));
     switch (mode()) {
         case Mode::elementSource:
             ++computer;
@@ -107,10 +107,10 @@ void SettingAdapter<Policy>::operator++() {
     }
 }
 
-template <class Policy>
-CMPIObjectPath* SettingAdapter<Policy>::getObjectPath() {
-    const Traced traced(at(Policy::unit));
-    CMPIObjectPath* path = ProviderUtilities::createObjectPath(broker, Policy::associationClass, nameSpace);
+template <class Traits>
+CMPIObjectPath* SettingAdapter<Traits>::getObjectPath() {
+    const Traced traced(at(Traits::traceSource));
+    CMPIObjectPath* path = ProviderUtilities::createObjectPath(broker, Traits::associationClass, nameSpace);
     if (path != nullptr) {
         ProviderUtilities::setKeyProperty(path, computerRole, computer.getObjectPath());
         ProviderUtilities::setKeyProperty(path, elementRole, element.getObjectPath());
@@ -118,9 +118,9 @@ CMPIObjectPath* SettingAdapter<Policy>::getObjectPath() {
     return path;
 }
 
-template <class Policy>
-CMPIInstance* SettingAdapter<Policy>::getCMPIInstance(const char** properties) {
-    const Traced traced(at(Policy::unit, Level::error), label::properties, properties);
+template <class Traits>
+CMPIInstance* SettingAdapter<Traits>::getCMPIInstance(const char** properties) {
+    const Traced traced(at(Traits::traceSource, Level::error), label::properties, properties);
     CMPIObjectPath* path = getObjectPath();
     CMPIInstance* instance = ProviderUtilities::createInstance(broker, path);
     if (instance == nullptr) {
@@ -135,9 +135,9 @@ CMPIInstance* SettingAdapter<Policy>::getCMPIInstance(const char** properties) {
     return instance;
 }
 
-template <class Policy>
-CMPIObjectPath* SettingAdapter<Policy>::getAssociatorNames() {
-    const Traced traced(at(Policy::unit));
+template <class Traits>
+CMPIObjectPath* SettingAdapter<Traits>::getAssociatorNames() {
+    const Traced traced(at(Traits::traceSource));
     switch (mode()) {
         case Mode::computerSource:
             return element.getObjectPath();
@@ -148,9 +148,9 @@ CMPIObjectPath* SettingAdapter<Policy>::getAssociatorNames() {
     }
 }
 
-template <class Policy>
-CMPIInstance* SettingAdapter<Policy>::getAssociator(const char** properties) {
-    const Traced traced(at(Policy::unit, Level::error), label::properties, properties);
+template <class Traits>
+CMPIInstance* SettingAdapter<Traits>::getAssociator(const char** properties) {
+    const Traced traced(at(Traits::traceSource, Level::error), label::properties, properties);
     switch (mode()) {
         case Mode::computerSource:
             return element.getCMPIInstance(properties);
@@ -162,9 +162,9 @@ CMPIInstance* SettingAdapter<Policy>::getAssociator(const char** properties) {
 }
 
 /** A path of the class with the keys that the source path's keys translate to. */
-template <class Policy>
+template <class Traits>
 template <class Translate>
-CMPIObjectPath* SettingAdapter<Policy>::locate(const char* className, const CMPIObjectPath* source,
+CMPIObjectPath* SettingAdapter<Traits>::locate(const char* className, const CMPIObjectPath* source,
                                                Translate translate) {
     CMPIObjectPath* path = ProviderUtilities::createObjectPath(broker, className, nameSpace);
     if (ProviderUtilities::getKeyCount(source) > 0) {
@@ -176,16 +176,16 @@ CMPIObjectPath* SettingAdapter<Policy>::locate(const char* className, const CMPI
     return path;
 }
 
-template <class Policy>
-CMPIObjectPath* SettingAdapter<Policy>::locateElement(const CMPIObjectPath* computerPath) {
-    const Traced traced(at(Policy::unit, Level::error, Policy::locate), label::objectPath, computerPath);
-    return locate(Policy::elementClass, computerPath,
-                  [&](Moniker& moniker) { return Policy::elementMoniker(setting, moniker); });
+template <class Traits>
+CMPIObjectPath* SettingAdapter<Traits>::locateElement(const CMPIObjectPath* computerPath) {
+    const Traced traced(at(Traits::traceSource, Level::error, Traits::locate), label::objectPath, computerPath);
+    return locate(Traits::elementClass, computerPath,
+                  [&](Moniker& moniker) { return Traits::elementMoniker(setting, moniker); });
 }
 
-template <class Policy>
-CMPIObjectPath* SettingAdapter<Policy>::locateComputer(const CMPIObjectPath* elementPath) {
-    const Traced traced(at(Policy::unit, Level::error), label::objectPath, elementPath);
+template <class Traits>
+CMPIObjectPath* SettingAdapter<Traits>::locateComputer(const CMPIObjectPath* elementPath) {
+    const Traced traced(at(Traits::traceSource, Level::error), label::objectPath, elementPath);
     return locate(computerClass, elementPath, [&](Moniker& moniker) { return setting.getComputerMoniker(moniker); });
 }
 

@@ -24,11 +24,11 @@ Mutex _fileMutex;
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerAssetIDDetails = LoggerNames::kept(LoggerNames::shortened);
+std::string loggerAssetIDDetails = LoggerNames::loggerName(LoggerNames::shortened);
 
 namespace {
 
-const TraceUnit unit{loggerAssetIDDetails, "AssetIDDetails.cpp"};
+const TraceSource traceSource{loggerAssetIDDetails, "AssetIDDetails.cpp"};
 
 constexpr const wchar_t* assetFileName = L"asset.dat";
 constexpr const char* assetCaption = "Asset ID Information";
@@ -86,7 +86,7 @@ void AssetIDDetails::forEachField(OnText onText, OnDate onDate) {
 }
 
 AssetIDDetails::AssetIDDetails() : _FileName(getFileName()) {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     std::optional<PropertyFile> file;
     std::optional<FileLock> lock;
     try {
@@ -96,30 +96,30 @@ AssetIDDetails::AssetIDDetails() : _FileName(getFileName()) {
             return;
         }
         file.emplace(File::Path(_FileName));
-        traceMessage(at(unit), "Opening File");
+        traceMessage(at(traceSource), "Opening File");
         lock.emplace();
-        traceMessage(at(unit), "File Locked successfully");
+        traceMessage(at(traceSource), "File Locked successfully");
         file->open(FILE_MODE_READ);
-        traceMessage(at(unit), "File Open successfully");
+        traceMessage(at(traceSource), "File Open successfully");
         readFixedFields(*file);
         readPersonalizedPairs(*file);
         _Loaded = true;
         file->close();
     } catch (...) {
         _Loaded = false;
-        traceMessage(at(unit), "Throwing Exception in Constructor");
+        traceMessage(at(traceSource), "Throwing Exception in Constructor");
     }
 }
 
 AssetIDDetails::~AssetIDDetails() {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
 }
 
 void AssetIDDetails::readFixedFields(PropertyFile& file) {
     forEachField(
         [&](const StoredFields::Field& field, std::string& text) {
             text = Utils::ReadStringFromFile(file, field.key);
-            traceVariable(at(unit, Level::flow, "AssetIDDetails"), field.name, text);
+            traceVariable(at(traceSource, Level::flow, "AssetIDDetails"), field.name, text);
         },
         [&](const StoredFields::Field& field, DateTime& date) { date = Utils::ReadDateFromFile(file, field.key); });
 }
@@ -133,15 +133,15 @@ void AssetIDDetails::readPersonalizedPairs(PropertyFile& file) {
     for (const PairKeys& keys : pairKeys) {
         std::string label = readOrNull(keys.label);
         std::string data = readOrNull(keys.data);
-        traceVariable(at(unit, Level::flow, "AssetIDDetails"), "label", label);
-        traceVariable(at(unit, Level::flow, "AssetIDDetails"), "data", data);
+        traceVariable(at(traceSource, Level::flow, "AssetIDDetails"), "label", label);
+        traceVariable(at(traceSource, Level::flow, "AssetIDDetails"), "data", data);
         pairs.emplace_back(std::move(label), std::move(data));
     }
     _PersonalizedData = std::move(pairs);
 }
 
 void AssetIDDetails::flushAssetData() {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     try {
         PropertyFile file{File::Path(_FileName)};
         const FileLock lock;
@@ -157,12 +157,12 @@ void AssetIDDetails::flushAssetData() {
         }
         file.close();
     } catch (...) {
-        traceMessage(at(unit), "Throwing Exception while writing Data");
+        traceMessage(at(traceSource), "Throwing Exception while writing Data");
     }
 }
 
 std::wstring AssetIDDetails::getFileName() {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     std::wstring path;
     std::optional<FileLock> lock;
     try {
@@ -171,27 +171,27 @@ std::wstring AssetIDDetails::getFileName() {
         File file(path);
         file.open(FILE_MODE_WRITE);
         file.close();
-        traceMessage(at(unit), "Asset.dat file opened in write mode Successfully");
+        traceMessage(at(traceSource), "Asset.dat file opened in write mode Successfully");
     } catch (...) {
-        traceMessage(at(unit, Level::detail), "Failed while opening Asset.dat in write mode");
+        traceMessage(at(traceSource, Level::detail), "Failed while opening Asset.dat in write mode");
     }
     return path;
 }
 
 AssetIDDetails::operator bool() const {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     return _ComputerNode;
 }
 
 void AssetIDDetails::operator++() {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     do {
         ++_ComputerNode;
     } while (_FilterActive && _ComputerNode && !evaluate());
 }
 
 void AssetIDDetails::setFilter(FilterType type, std::string value) {
-    const Traced traced(at(unit, Level::error), label::filterType, type, label::reference, value);
+    const Traced traced(at(traceSource, Level::error), label::filterType, type, label::reference, value);
     _FilterActive = true;
     _Filters.push_back({type, value});
     while (_ComputerNode && !evaluate()) {
@@ -200,7 +200,7 @@ void AssetIDDetails::setFilter(FilterType type, std::string value) {
 }
 
 bool AssetIDDetails::evaluate() const {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     return std::all_of(_Filters.begin(), _Filters.end(), [&](const Filter& filter) {
         std::string value;
         return !comparedValue(filter.type, value) || value == filter.value;
@@ -251,59 +251,59 @@ void AssetIDDetails::store(const CallSite& site, DateTime& member, const std::st
 }
 
 bool AssetIDDetails::getAssetNumber(std::string& value) const {
-    return stored(at(unit), _AssetNumber, value);
+    return stored(at(traceSource), _AssetNumber, value);
 }
 
 bool AssetIDDetails::getAssetIdTag(std::string& value) const {
-    return stored(at(unit), _AssetIdTag, value);
+    return stored(at(traceSource), _AssetIdTag, value);
 }
 
 bool AssetIDDetails::getPrimaryOwnerName(std::string& value) const {
-    return stored(at(unit), _OwnerName, value);
+    return stored(at(traceSource), _OwnerName, value);
 }
 
 bool AssetIDDetails::getPrimaryOwnerPhone(std::string& value) const {
-    return stored(at(unit), _OwnerPhone, value);
+    return stored(at(traceSource), _OwnerPhone, value);
 }
 
 bool AssetIDDetails::getPrimaryOwnerPosition(std::string& value) const {
-    return stored(at(unit), _OwnerPosition, value);
+    return stored(at(traceSource), _OwnerPosition, value);
 }
 
 bool AssetIDDetails::getPrimaryOwnerDepartment(std::string& value) const {
-    return stored(at(unit), _OwnerDepartment, value);
+    return stored(at(traceSource), _OwnerDepartment, value);
 }
 
 bool AssetIDDetails::getSystemLocation(std::string& value) const {
-    return stored(at(unit), _SystemLocation, value);
+    return stored(at(traceSource), _SystemLocation, value);
 }
 
 bool AssetIDDetails::getZOPMProfile(std::string& value) const {
-    return stored(at(unit), _ZOPMProfile, value);
+    return stored(at(traceSource), _ZOPMProfile, value);
 }
 
 bool AssetIDDetails::getDeploymentProfile(std::string& value) const {
-    return stored(at(unit), _ZOPMProfile, value);
+    return stored(at(traceSource), _ZOPMProfile, value);
 }
 
 bool AssetIDDetails::getLastInventoried(std::string& value) const {
-    return stored(at(unit), _LastInventoried, value);
+    return stored(at(traceSource), _LastInventoried, value);
 }
 
 bool AssetIDDetails::getPurchaseDate(std::string& value) const {
-    return stored(at(unit), _PurchaseDate, value);
+    return stored(at(traceSource), _PurchaseDate, value);
 }
 
 bool AssetIDDetails::getZOPMUpdateTime(std::string& value) const {
-    return stored(at(unit), _ZOPMUpdateTime, value);
+    return stored(at(traceSource), _ZOPMUpdateTime, value);
 }
 
 bool AssetIDDetails::getDeploymentUpdateTime(std::string& value) const {
-    return stored(at(unit), _ZOPMUpdateTime, value);
+    return stored(at(traceSource), _ZOPMUpdateTime, value);
 }
 
 bool AssetIDDetails::getPersonalizedData(std::vector<PersonalizedPair>& value) const {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     if (_Loaded) {
         value = _PersonalizedData;
     }
@@ -311,22 +311,22 @@ bool AssetIDDetails::getPersonalizedData(std::vector<PersonalizedPair>& value) c
 }
 
 bool AssetIDDetails::getCSName(std::string& value) const {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     return _ComputerNode.getProperty(NodeLexicon::PROPERTY_NAME, value);
 }
 
 bool AssetIDDetails::getName(std::string& value) const {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     return _ComputerNode.getProperty(NodeLexicon::PROPERTY_NAME, value);
 }
 
 bool AssetIDDetails::getVendor(std::string& value) const {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     return _SystemNode.getProperty(NodeLexicon::PROPERTY_VENDOR, value);
 }
 
 bool AssetIDDetails::getProductName(std::string& value) const {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     std::string name;
     if (!_ComputerNode.getProperty(NodeLexicon::PROPERTY_PRODUCT_NAME, name)) {
         return false;
@@ -340,77 +340,77 @@ bool AssetIDDetails::getProductName(std::string& value) const {
 }
 
 std::string AssetIDDetails::getIdentifyingNumber() const {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     return _SystemNode.convertPathToString(_SystemNode.getPathToNode());
 }
 
 std::string AssetIDDetails::getVersion() const {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     return make_string(Product::getVersion());
 }
 
 std::string AssetIDDetails::getCaption() const {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     return assetCaption;
 }
 
 std::string AssetIDDetails::getDescription() const {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     return assetCaption;
 }
 
 unsigned int AssetIDDetails::getAssetIDStringArea() const {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     return assetStringArea;
 }
 
 std::string AssetIDDetails::getLocalDateTime() const {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     return Utils::convertCIMDateTime(DateTime(std::time(nullptr), presentTime));
 }
 
 void AssetIDDetails::setAssetNumber(const std::string& value) {
-    store(at(unit), _AssetNumber, value);
+    store(at(traceSource), _AssetNumber, value);
 }
 
 void AssetIDDetails::setOwnerName(const std::string& value) {
-    store(at(unit), _OwnerName, value);
+    store(at(traceSource), _OwnerName, value);
 }
 
 void AssetIDDetails::setOwnerPhone(const std::string& value) {
-    store(at(unit), _OwnerPhone, value);
+    store(at(traceSource), _OwnerPhone, value);
 }
 
 void AssetIDDetails::setOwnerPosition(const std::string& value) {
-    store(at(unit), _OwnerPosition, value);
+    store(at(traceSource), _OwnerPosition, value);
 }
 
 void AssetIDDetails::setOwnerDepartment(const std::string& value) {
-    store(at(unit), _OwnerDepartment, value);
+    store(at(traceSource), _OwnerDepartment, value);
 }
 
 void AssetIDDetails::setSystemLocation(const std::string& value) {
-    store(at(unit), _SystemLocation, value);
+    store(at(traceSource), _SystemLocation, value);
 }
 
 void AssetIDDetails::setZOPMProfile(const std::string& value) {
-    store(at(unit), _ZOPMProfile, value);
+    store(at(traceSource), _ZOPMProfile, value);
 }
 
 void AssetIDDetails::setLastInventoried(const std::string& value) {
-    store(at(unit), _LastInventoried, value);
+    store(at(traceSource), _LastInventoried, value);
 }
 
 void AssetIDDetails::setSystemPurchaseDate(const std::string& value) {
-    store(at(unit), _PurchaseDate, value);
+    store(at(traceSource), _PurchaseDate, value);
 }
 
 void AssetIDDetails::setZOPMUpdateTime(const std::string& value) {
-    store(at(unit), _ZOPMUpdateTime, value);
+    store(at(traceSource), _ZOPMUpdateTime, value);
 }
 
 void AssetIDDetails::setPersonalizedData(const std::vector<PersonalizedPair>& value) {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     _PersonalizedData = value;
 }
 

@@ -8,11 +8,11 @@
 namespace KO::LeaseWarrantyProvider {
 
 /** What the design shared with the warranty element needs to know of leases. */
-struct LeaseElement {
+struct LeaseElementTraits {
     using Base = LeaseBase;
 
-    static const TraceUnit unit;
-    static const RecordElementTexts texts;
+    static const TraceSource traceSource;
+    static const RecordElementNames names;
 };
 
 /**
@@ -21,7 +21,7 @@ struct LeaseElement {
  * The getters of the current lease answer true. They and the setters throw InstrumentationException
  * when no lease is current.
  */
-class Lease : public RecordElement<LeaseElement> {
+class Lease : public RecordElement<LeaseElementTraits> {
 public:
     bool createLease(std::string instanceId) { return create(instanceId); }
     void removeLease() { remove(); }

@@ -5,10 +5,10 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerLeaseSetting = LoggerNames::kept(LoggerNames::provider);
+std::string loggerLeaseSetting = LoggerNames::loggerName(LoggerNames::provider);
 
-const TraceUnit LeaseSettingElement::unit{loggerLeaseSetting, "LeaseSetting.cpp"};
+const TraceSource LeaseSettingElementTraits::traceSource{loggerLeaseSetting, "LeaseSetting.cpp"};
 
-template class SettingElement<LeaseSettingElement>;
+template class SettingElement<LeaseSettingElementTraits>;
 
 }  // namespace KO::LeaseWarrantyProvider

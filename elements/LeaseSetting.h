@@ -6,7 +6,7 @@
 namespace KO::LeaseWarrantyProvider {
 
 /** What the design that the setting elements share needs to know of leases. */
-struct LeaseSettingElement {
+struct LeaseSettingElementTraits {
     using Element = Lease;
     static constexpr const char* constructor = "LeaseSetting";
     static constexpr const char* destructor = "~LeaseSetting";
@@ -14,15 +14,15 @@ struct LeaseSettingElement {
     static constexpr bool toElementExits = false;  // unlike every other operation
     static constexpr const char* elementLabel = " monikerLease=";
 
-    static const TraceUnit unit;
+    static const TraceSource traceSource;
 };
 
 /** The managed element of VELKO_LeaseSetting: which lease a computer has, and which computer has a lease. */
-class LeaseSetting : public SettingElement<LeaseSettingElement> {
+class LeaseSetting : public SettingElement<LeaseSettingElementTraits> {
 public:
     Moniker getLeaseMoniker(Moniker& computerMoniker) { return getElementMoniker(computerMoniker); }
 };
 
-extern template class SettingElement<LeaseSettingElement>;
+extern template class SettingElement<LeaseSettingElementTraits>;
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -1,6 +1,6 @@
 #include "OstrelAgent.h"
 
-#include "Exceptions.h"
+#include "KO/Exceptions.h"
 #include "KO/File.h"
 #include "KO/PlatformUtilities.h"
 #include "KO/Product.h"
@@ -13,11 +13,11 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerOstrelAgent = LoggerNames::kept(LoggerNames::shortened);
+std::string loggerOstrelAgent = LoggerNames::loggerName(LoggerNames::shortened);
 
 namespace {
 
-const TraceUnit unit{loggerOstrelAgent, "OstrelAgent.cpp"};
+const TraceSource traceSource{loggerOstrelAgent, "OstrelAgent.cpp"};
 
 constexpr const char* agentCaption = "VEL Ostrel";
 
@@ -50,70 +50,70 @@ constexpr std::array<ComparedValue, 5> comparedValues{{
 }  // namespace
 
 OstrelAgent::OstrelAgent() {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
 }
 
 OstrelAgent::operator bool() const {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     return !_Done;
 }
 
 void OstrelAgent::operator++() {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     _Done = true;
 }
 
 void OstrelAgent::setFilter(FilterType type, std::string value) const {
-    const Traced traced(at(unit, Level::error), label::filterTypeBare, type, label::keyValue, value);
+    const Traced traced(at(traceSource, Level::error), label::filterTypeBare, type, label::keyValue, value);
     const auto ofType = [&](const ComparedValue& compared) { return compared.type == type; };
     const auto compared = std::find_if(comparedValues.begin(), comparedValues.end(), ofType);
     if (compared != comparedValues.end() && (this->*compared->get)() != value) {
-        fail<InstrumentationException>(at(unit), "Could not find specified Agent.");
+        fail<InstrumentationException>(at(traceSource), "Could not find specified Agent.");
     }
 }
 
 std::string OstrelAgent::getName() const {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     return displayName();
 }
 
 std::string OstrelAgent::getProductName() const {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     return displayName();
 }
 
 std::string OstrelAgent::getVersion() const {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     return make_string(Product::getVersion());
 }
 
 std::string OstrelAgent::getBuildNumber() const {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     return make_string(Product::getBuildNumber());
 }
 
 std::string OstrelAgent::getIdentifyingNumber() const {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     return make_string(Product::getIdentifyingNumber());
 }
 
 std::string OstrelAgent::getVendor() const {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     return make_string(Product::getVendor());
 }
 
 std::string OstrelAgent::getCaption() const {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     return agentCaption;
 }
 
 std::string OstrelAgent::getDescription() const {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     return agentCaption;
 }
 
 std::string OstrelAgent::getStatus() const {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     return "OK";
 }
 

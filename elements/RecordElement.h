@@ -1,5 +1,6 @@
 #pragma once
 
+#include "FixedString.h"
 #include "Trace.h"
 
 #include <string>
@@ -7,15 +8,24 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-/** What differs in the wording of two record elements: their texts, and their names in the log. */
-struct RecordElementTexts {
-    const char* name;  ///< element type, its destructor and its operations
-    const char* destructorName;
-    const char* createName;
-    const char* removeName;
-    const char* elementName;        ///< value of the ElementName property
-    const char* removeUnfiltered;   ///< thrown when a record is to be removed and none was identified
-    const char* identifierMissing;  ///< thrown when the current record gives no identifier
+/** The names in the log and the messages of a record element, derived from its class name ("Lease"). */
+struct RecordElementNames {
+    explicit constexpr RecordElementNames(const char* className)
+        : name{className},
+          destructorName{"~", className},
+          createName{"create", className},
+          removeName{"remove", className},
+          elementName{className, " Information"},
+          removeUnfiltered{"Identify a ", className, " to remove."},
+          identifierMissing{"Could not find Instance ID property on ", className, "."} {}
+
+    FixedString name;
+    FixedString destructorName;
+    FixedString createName;
+    FixedString removeName;
+    FixedString elementName;        ///< value of the ElementName property
+    FixedString removeUnfiltered;   ///< thrown if a record is to be removed and no filter is set
+    FixedString identifierMissing;  ///< thrown if the current record has no identifier
 };
 
 /**
@@ -25,11 +35,11 @@ struct RecordElementTexts {
  * One is made for a request. It then stands on the first record; only setFilter and operator++ look at
  * the filters. What it changes is seen by all at once, and the record file is rewritten when it ends.
  *
- * Policy gives:
+ * Traits gives:
  *   Base               the record cursor
- *   unit, texts        trace unit and RecordElementTexts of the element
+ *   traceSource, names trace source and RecordElementNames of the element
  */
-template <class Policy>
+template <class Traits>
 class RecordElement {
 public:
     /** What a filter compares. Values without a name are kept and match every record. */
@@ -87,7 +97,7 @@ public:
     bool getInstanceID(std::string& value) const;
 
 protected:
-    using Property = typename Policy::Base::Property;
+    using Property = typename Traits::Base::Property;
 
     /** Reads or writes a property of the current record under the name of the calling operation. */
     template <class Value>
@@ -97,7 +107,7 @@ protected:
 
     bool filterSet = false;
     std::vector<Filter> filters{};
-    typename Policy::Base base{};
+    typename Traits::Base base{};
 };
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -3,40 +3,40 @@
 // Definitions of RecordElement. Included by the source file of each element and nowhere else, so that
 // each element's code and trace buffers stand in its own unit.
 
-#include "Exceptions.h"
+#include "KO/Exceptions.h"
 #include "RecordElement.h"
 
 #include <algorithm>
 
 namespace KO::LeaseWarrantyProvider {
 
-template <class Policy>
-RecordElement<Policy>::RecordElement() {
-    const Traced traced(at(Policy::unit, Level::flow, Policy::texts.name));
+template <class Traits>
+RecordElement<Traits>::RecordElement() {
+    const Traced traced(at(Traits::traceSource, Level::flow, Traits::names.name));
 }
 
-template <class Policy>
-RecordElement<Policy>::~RecordElement() noexcept(false) {
-    const Traced traced(at(Policy::unit, Level::flow, Policy::texts.destructorName));
+template <class Traits>
+RecordElement<Traits>::~RecordElement() noexcept(false) {
+    const Traced traced(at(Traits::traceSource, Level::flow, Traits::names.destructorName));
 }
 
-template <class Policy>
-RecordElement<Policy>::operator bool() {
-    const Traced traced(at(Policy::unit));
+template <class Traits>
+RecordElement<Traits>::operator bool() {
+    const Traced traced(at(Traits::traceSource));
     return base;
 }
 
-template <class Policy>
-void RecordElement<Policy>::operator++() {
-    const Traced traced(at(Policy::unit));
+template <class Traits>
+void RecordElement<Traits>::operator++() {
+    const Traced traced(at(Traits::traceSource));
     do {
         ++base;
     } while (filterSet && base && !evaluate());
 }
 
-template <class Policy>
-void RecordElement<Policy>::setFilter(FilterType type, std::string reference) {
-    const Traced traced(at(Policy::unit), label::filterType, type, label::reference, reference);
+template <class Traits>
+void RecordElement<Traits>::setFilter(FilterType type, std::string reference) {
+    const Traced traced(at(Traits::traceSource), label::filterType, type, label::reference, reference);
     filterSet = true;
     filters.push_back({type, reference});
     while (base && !evaluate()) {
@@ -44,26 +44,27 @@ void RecordElement<Policy>::setFilter(FilterType type, std::string reference) {
     }
 }
 
-template <class Policy>
-bool RecordElement<Policy>::evaluate() const {
-    const Traced traced(at(Policy::unit));
+template <class Traits>
+bool RecordElement<Traits>::evaluate() const {
+    const Traced traced(at(Traits::traceSource));
     const auto passes = [&](const Filter& filter) {
         if (filter.type != InstanceIDFilter) {
             return true;
         }
         std::string identifier;
         if (!base.getProperty(Property::InstanceID, identifier)) {
-            fail<InstrumentationException>(at(Policy::unit, Level::flow, "evaluate"), Policy::texts.identifierMissing);
+            fail<InstrumentationException>(at(Traits::traceSource, Level::flow, "evaluate"),
+                                           Traits::names.identifierMissing);
         }
         return identifier == filter.reference;
     };
     return std::all_of(filters.begin(), filters.end(), passes);
 }
 
-template <class Policy>
-bool RecordElement<Policy>::getElementName(std::string& value) const {
-    const Traced traced(at(Policy::unit));
-    value = Policy::texts.elementName;
+template <class Traits>
+bool RecordElement<Traits>::getElementName(std::string& value) const {
+    const Traced traced(at(Traits::traceSource));
+    value = Traits::names.elementName;
     return true;
 }
 
@@ -77,57 +78,57 @@ bool notAvailable(const CallSite& site) {
 
 }  // namespace
 
-template <class Policy>
-bool RecordElement<Policy>::getCaption(std::string&) const {
-    return notAvailable(at(Policy::unit));
+template <class Traits>
+bool RecordElement<Traits>::getCaption(std::string&) const {
+    return notAvailable(at(Traits::traceSource));
 }
 
-template <class Policy>
-bool RecordElement<Policy>::getDescription(std::string&) const {
-    return notAvailable(at(Policy::unit));
+template <class Traits>
+bool RecordElement<Traits>::getDescription(std::string&) const {
+    return notAvailable(at(Traits::traceSource));
 }
 
-template <class Policy>
-bool RecordElement<Policy>::getConfigurationName(std::string&) const {
-    return notAvailable(at(Policy::unit));
+template <class Traits>
+bool RecordElement<Traits>::getConfigurationName(std::string&) const {
+    return notAvailable(at(Traits::traceSource));
 }
 
-template <class Policy>
-bool RecordElement<Policy>::getChangeableType(unsigned short&) const {
-    return notAvailable(at(Policy::unit));
+template <class Traits>
+bool RecordElement<Traits>::getChangeableType(unsigned short&) const {
+    return notAvailable(at(Traits::traceSource));
 }
 
-template <class Policy>
-bool RecordElement<Policy>::getInstanceID(std::string& value) const {
-    return get(at(Policy::unit), Property::InstanceID, value);
+template <class Traits>
+bool RecordElement<Traits>::getInstanceID(std::string& value) const {
+    return get(at(Traits::traceSource), Property::InstanceID, value);
 }
 
-template <class Policy>
-bool RecordElement<Policy>::create(std::string instanceId) {
-    const Traced traced(at(Policy::unit, Level::flow, Policy::texts.createName), label::instanceId, instanceId);
+template <class Traits>
+bool RecordElement<Traits>::create(std::string instanceId) {
+    const Traced traced(at(Traits::traceSource, Level::flow, Traits::names.createName), label::instanceId, instanceId);
     return base.create(instanceId);
 }
 
-template <class Policy>
-void RecordElement<Policy>::remove() {
-    const CallSite site = at(Policy::unit, Level::flow, Policy::texts.removeName);
+template <class Traits>
+void RecordElement<Traits>::remove() {
+    const CallSite site = at(Traits::traceSource, Level::flow, Traits::names.removeName);
     const Traced traced(site);
     if (!filterSet) {
-        fail<InstrumentationException>(here(site), Policy::texts.removeUnfiltered);
+        fail<InstrumentationException>(here(site), Traits::names.removeUnfiltered);
     }
     base.remove();
 }
 
-template <class Policy>
+template <class Traits>
 template <class Value>
-bool RecordElement<Policy>::get(const CallSite& site, Property property, Value& value) const {
+bool RecordElement<Traits>::get(const CallSite& site, Property property, Value& value) const {
     const Traced traced(site);
     return base.getProperty(property, value);
 }
 
-template <class Policy>
+template <class Traits>
 template <class Value>
-void RecordElement<Policy>::set(const CallSite& site, Property property, const Value& value) {
+void RecordElement<Traits>::set(const CallSite& site, Property property, const Value& value) {
     const Traced traced(site);
     base.setProperty(property, value);
 }

@@ -17,14 +17,14 @@ namespace KO::LeaseWarrantyProvider {
  * name, or is not there where a record tells its place. Of what arises below them they let these two
  * classes out; any other exception ends the process.
  *
- * Policy gives:
+ * Traits gives:
  *   Element                          the element of the records
- *   unit                             trace unit
+ *   traceSource                      trace source
  *   constructor, destructor          their names in the log
  *   toElement, toElementExits        name in the log of the way to the record, and whether its exit is traced
  *   elementLabel                     label of the record's moniker
  */
-template <class Policy>
+template <class Traits>
 class SettingElement {
 public:
     SettingElement();
@@ -47,7 +47,7 @@ private:
     Moniker toComputer(const CallSite& site, Moniker& elementMoniker);
 
     Instrumentation instrumentation{};
-    typename Policy::Element element{};
+    typename Traits::Element element{};
 };
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -3,7 +3,7 @@
 // Definitions of SettingElement. Included by the source file of each setting element and nowhere else, so
 // that each element's code and trace buffers stand in its own unit.
 
-#include "Exceptions.h"
+#include "KO/Exceptions.h"
 #include "SettingElement.h"
 
 #include <exception>
@@ -72,21 +72,23 @@ void selectComputer(const CallSite& site, Instrumentation& instrumentation, cons
 
 }  // namespace
 
-template <class Policy>
-SettingElement<Policy>::SettingElement() {
-    traceMethod(at(Policy::unit, Level::flow, Policy::constructor));
+template <class Traits>
+SettingElement<Traits>::SettingElement() {
+    traceMethod(at(Traits::traceSource, Level::flow, Traits::constructor));
 }
 
-template <class Policy>
-SettingElement<Policy>::~SettingElement() noexcept(false) {
-    traceMethod(at(Policy::unit, Level::flow, Policy::destructor));
+template <class Traits>
+SettingElement<Traits>::~SettingElement() noexcept(false) {
+    traceMethod(at(Traits::traceSource, Level::flow, Traits::destructor));
 }
 
-template <class Policy>
-Moniker SettingElement<Policy>::getElementMoniker(Moniker& computerMoniker) {
-    const CallSite site = at(Policy::unit, Level::error, Policy::toElement);
-    const auto work = [&] { return toElement(at(Policy::unit, Level::flow, Policy::toElement), computerMoniker); };
-    if constexpr (Policy::toElementExits) {
+template <class Traits>
+Moniker SettingElement<Traits>::getElementMoniker(Moniker& computerMoniker) {
+    const CallSite site = at(Traits::traceSource, Level::error, Traits::toElement);
+    const auto work = [&] {
+        return toElement(at(Traits::traceSource, Level::flow, Traits::toElement), computerMoniker);
+    };
+    if constexpr (Traits::toElementExits) {
         const Traced traced(site, label::monikerComputer, &computerMoniker);
         return throwingOnlyDeclared(work);
     } else {
@@ -95,26 +97,26 @@ Moniker SettingElement<Policy>::getElementMoniker(Moniker& computerMoniker) {
     }
 }
 
-template <class Policy>
-Moniker SettingElement<Policy>::getComputerMoniker(Moniker& elementMoniker) {
-    const Traced traced(at(Policy::unit, Level::error), Policy::elementLabel, &elementMoniker);
-    const CallSite site = at(Policy::unit);
+template <class Traits>
+Moniker SettingElement<Traits>::getComputerMoniker(Moniker& elementMoniker) {
+    const Traced traced(at(Traits::traceSource, Level::error), Traits::elementLabel, &elementMoniker);
+    const CallSite site = at(Traits::traceSource);
     return throwingOnlyDeclared([&] { return toComputer(site, elementMoniker); });
 }
 
-template <class Policy>
-Moniker SettingElement<Policy>::toElement(const CallSite& site, Moniker& computerMoniker) {
+template <class Traits>
+Moniker SettingElement<Traits>::toElement(const CallSite& site, Moniker& computerMoniker) {
     const std::string name = keyValue(site, computerMoniker, computerKey, "Could not find 'Name' Key in Moniker");
     traceVariable(here(site), computerKey, name);
     selectComputer(site, instrumentation, name);
     const std::string instanceId = instrumentation.convertPathToString(instrumentation.getPathToNode());
-    element.setFilter(Policy::Element::InstanceIDFilter, instanceId);
+    element.setFilter(Traits::Element::InstanceIDFilter, instanceId);
     traceVariable(here(site), elementKey, instanceId);
     return singleKeyMoniker(elementKey, instanceId);
 }
 
-template <class Policy>
-Moniker SettingElement<Policy>::toComputer(const CallSite& site, Moniker& elementMoniker) {
+template <class Traits>
+Moniker SettingElement<Traits>::toComputer(const CallSite& site, Moniker& elementMoniker) {
     const std::string instanceId =
         keyValue(site, elementMoniker, elementKey, "Could not find 'InstanceID' Key in Moniker");
     instrumentation.selectNode(instrumentation.convertStringToPath(instanceId));

@@ -5,46 +5,38 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerWarranty = LoggerNames::kept(LoggerNames::provider);
+std::string loggerWarranty = LoggerNames::loggerName(LoggerNames::provider);
 
 using Property = Properties::Warranty;
 
-const TraceUnit WarrantyElement::unit{loggerWarranty, "Warranty.cpp"};
+const TraceSource WarrantyElementTraits::traceSource{loggerWarranty, "Warranty.cpp"};
 
-const RecordElementTexts WarrantyElement::texts{
-    "Warranty",
-    "~Warranty",
-    "createWarranty",
-    "removeWarranty",
-    "Warranty Information",
-    "Identify a Warranty to remove.",
-    "Could not find Instance ID property on Warranty.",
-};
+const RecordElementNames WarrantyElementTraits::names{"Warranty"};
 
-template class RecordElement<WarrantyElement>;
+template class RecordElement<WarrantyElementTraits>;
 
 bool Warranty::getWarrantor(std::string& value) const {
-    return get(at(WarrantyElement::unit), Property::Warrantor, value);
+    return get(at(WarrantyElementTraits::traceSource), Property::Warrantor, value);
 }
 
 bool Warranty::getCommencementDate(std::string& value) const {
-    return get(at(WarrantyElement::unit), Property::CommencementDate, value);
+    return get(at(WarrantyElementTraits::traceSource), Property::CommencementDate, value);
 }
 
 bool Warranty::getDuration(unsigned int& value) const {
-    return get(at(WarrantyElement::unit), Property::Duration, value);
+    return get(at(WarrantyElementTraits::traceSource), Property::Duration, value);
 }
 
 void Warranty::setWarrantor(std::string value) {
-    set(at(WarrantyElement::unit), Property::Warrantor, value);
+    set(at(WarrantyElementTraits::traceSource), Property::Warrantor, value);
 }
 
 void Warranty::setCommencementDate(std::string value) {
-    set(at(WarrantyElement::unit), Property::CommencementDate, value);
+    set(at(WarrantyElementTraits::traceSource), Property::CommencementDate, value);
 }
 
 void Warranty::setDuration(unsigned int value) {
-    set(at(WarrantyElement::unit), Property::Duration, value);
+    set(at(WarrantyElementTraits::traceSource), Property::Duration, value);
 }
 
 }  // namespace KO::LeaseWarrantyProvider

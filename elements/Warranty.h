@@ -8,11 +8,11 @@
 namespace KO::LeaseWarrantyProvider {
 
 /** What the design shared with the lease element needs to know of warranties. */
-struct WarrantyElement {
+struct WarrantyElementTraits {
     using Base = WarrantyBase;
 
-    static const TraceUnit unit;
-    static const RecordElementTexts texts;
+    static const TraceSource traceSource;
+    static const RecordElementNames names;
 };
 
 /**
@@ -21,7 +21,7 @@ struct WarrantyElement {
  * The getters of the current warranty answer true. They and the setters throw InstrumentationException
  * when no warranty is current.
  */
-class Warranty : public RecordElement<WarrantyElement> {
+class Warranty : public RecordElement<WarrantyElementTraits> {
 public:
     bool createWarranty(std::string instanceId) { return create(instanceId); }
     void removeWarranty() { remove(); }

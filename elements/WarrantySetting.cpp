@@ -5,10 +5,10 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerWarrantySetting = LoggerNames::kept(LoggerNames::provider);
+std::string loggerWarrantySetting = LoggerNames::loggerName(LoggerNames::provider);
 
-const TraceUnit WarrantySettingElement::unit{loggerWarrantySetting, "WarrantySetting.cpp"};
+const TraceSource WarrantySettingElementTraits::traceSource{loggerWarrantySetting, "WarrantySetting.cpp"};
 
-template class SettingElement<WarrantySettingElement>;
+template class SettingElement<WarrantySettingElementTraits>;
 
 }  // namespace KO::LeaseWarrantyProvider

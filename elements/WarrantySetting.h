@@ -6,7 +6,7 @@
 namespace KO::LeaseWarrantyProvider {
 
 /** What the design that the setting elements share needs to know of warranties. */
-struct WarrantySettingElement {
+struct WarrantySettingElementTraits {
     using Element = Warranty;
     static constexpr const char* constructor = "WarrantySetting";
     static constexpr const char* destructor = "~WarrantySetting";
@@ -14,15 +14,15 @@ struct WarrantySettingElement {
     static constexpr bool toElementExits = true;
     static constexpr const char* elementLabel = " monikerWarranty=";
 
-    static const TraceUnit unit;
+    static const TraceSource traceSource;
 };
 
 /** The managed element of VELKO_WarrantySetting: which warranty a computer has, and which computer has a warranty. */
-class WarrantySetting : public SettingElement<WarrantySettingElement> {
+class WarrantySetting : public SettingElement<WarrantySettingElementTraits> {
 public:
     Moniker getWarrantyMoniker(Moniker& computerMoniker) { return getElementMoniker(computerMoniker); }
 };
 
-extern template class SettingElement<WarrantySettingElement>;
+extern template class SettingElement<WarrantySettingElementTraits>;
 
 }  // namespace KO::LeaseWarrantyProvider

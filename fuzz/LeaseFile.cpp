@@ -1,8 +1,8 @@
 #include "LeaseBase.h"
 #include "RecordFile.h"
 
-using KO::LeaseWarrantyProvider::LeaseStore;
+using KO::LeaseWarrantyProvider::LeaseStoreTraits;
 
 int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-    return fuzz::tryRecordFile<LeaseStore>(testsupport::leaseFields(), fuzz::textOf(data, size));
+    return fuzz::tryRecordFile<LeaseStoreTraits>(testsupport::leaseFields(), fuzz::textOf(data, size));
 }

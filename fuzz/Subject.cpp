@@ -169,14 +169,14 @@ void writeDataFile(const std::string& name, const std::string& content) {
 }
 
 const Store& leaseStore() {
-    static const Store store{"VELKO_Lease", "Lease.dat", testsupport::leaseFields, recordsOf<LeaseStore>,
-                             countOf<LeaseStore>};
+    static const Store store{"VELKO_Lease", "Lease.dat", testsupport::leaseFields, recordsOf<LeaseStoreTraits>,
+                             countOf<LeaseStoreTraits>};
     return store;
 }
 
 const Store& warrantyStore() {
-    static const Store store{"VELKO_Warranty", "Warranty.dat", testsupport::warrantyFields, recordsOf<WarrantyStore>,
-                             countOf<WarrantyStore>};
+    static const Store store{"VELKO_Warranty", "Warranty.dat", testsupport::warrantyFields,
+                             recordsOf<WarrantyStoreTraits>, countOf<WarrantyStoreTraits>};
     return store;
 }
 
@@ -196,8 +196,8 @@ Subject::Subject(std::size_t computers) {
 }
 
 void Subject::restart() {
-    reload<LeaseStore>();
-    reload<WarrantyStore>();
+    reload<LeaseStoreTraits>();
+    reload<WarrantyStoreTraits>();
 }
 
 cimhost::RawAnswer Subject::make(const Call& call) {

@@ -1,8 +1,8 @@
 #include "RecordFile.h"
 #include "WarrantyBase.h"
 
-using KO::LeaseWarrantyProvider::WarrantyStore;
+using KO::LeaseWarrantyProvider::WarrantyStoreTraits;
 
 int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-    return fuzz::tryRecordFile<WarrantyStore>(testsupport::warrantyFields(), fuzz::textOf(data, size));
+    return fuzz::tryRecordFile<WarrantyStoreTraits>(testsupport::warrantyFields(), fuzz::textOf(data, size));
 }

@@ -16,7 +16,7 @@ constexpr const char* shortened = "Tarvik.LeaseWarrantyProvider";
  * A name as a unit keeps it. The units' names are made while the library is loaded, which must not fail: where memory
  * is lacking then, it is a shorter name that needs none.
  */
-inline std::string kept(const char* name) noexcept {
+inline std::string loggerName(const char* name) noexcept {
     try {
         return name;
     } catch (const std::exception&) {

@@ -12,10 +12,10 @@
 /**
  * Tracing of the provider's functions. It throws nothing: a line that cannot be written is lost.
  *
- * A source unit binds its logger and file name once, in a TraceUnit named `unit`. A function then
+ * A source unit binds its logger and file name once, in a TraceSource named `traceSource`. A function then
  * traces its entry and its exit with one line at its head:
  *
- *     const Traced traced(at(unit), label::instanceId, instanceId);
+ *     const Traced traced(at(traceSource), label::instanceId, instanceId);
  *
  * Every line goes to the log channel and then to the trace channel. Like the formatting functions,
  * what stands in the unnamed namespace exists once a unit, with the unit's own buffers.
@@ -30,28 +30,28 @@ constexpr int detail = 6000;  ///< written only by a logger that is raised to it
 }  // namespace Level
 
 /** What all trace lines of a source unit share. */
-struct TraceUnit {
+struct TraceSource {
     const std::string& logger;
     const char* file;
 };
 
 /** Where in a unit a line comes from, and how loud it is. */
 struct CallSite {
-    const TraceUnit* unit;
+    const TraceSource* source;
     int level;
     const char* function;
     unsigned int line;
 };
 
 /** The place of the call itself. The last two arguments are for code that works under another's name. */
-inline CallSite at(const TraceUnit& unit, int level = Level::flow, const char* function = __builtin_FUNCTION(),
+inline CallSite at(const TraceSource& source, int level = Level::flow, const char* function = __builtin_FUNCTION(),
                    unsigned int line = __builtin_LINE()) {
-    return {&unit, level, function, line};
+    return {&source, level, function, line};
 }
 
 /** The place of the call itself, under the name and at the level of the function that it works for. */
 inline CallSite here(const CallSite& caller, unsigned int line = __builtin_LINE()) {
-    return {caller.unit, caller.level, caller.function, line};
+    return {caller.source, caller.level, caller.function, line};
 }
 
 namespace {
@@ -59,7 +59,7 @@ namespace {
 /** Whether somebody may read a line of the site. A logging library that cannot tell is given every line. */
 inline bool isWanted(const CallSite& site) noexcept {
     using RZLog::RZLogger;
-    return RZLogger::admits == nullptr || RZLogger::admits(site.unit->logger, site.level);
+    return RZLogger::admits == nullptr || RZLogger::admits(site.source->logger, site.level);
 }
 
 /**
@@ -72,9 +72,9 @@ void writeLine(const CallSite& site, Format format) noexcept {
         return;
     }
     try {
-        const char* file = site.unit->file;
+        const char* file = site.source->file;
         const int line = static_cast<int>(site.line);
-        const std::string& logger = site.unit->logger;
+        const std::string& logger = site.source->logger;
         RZLog::RZMessageBuffer message;
         RZLog::RZLogger::logLevelMessage(site.function, file, line, logger, site.level, nullptr, 0, 0,
                                          message.str(message << format()));
@@ -100,11 +100,11 @@ void traceLine(const CallSite& site, MessageType type, const Parts&... parts) no
         return;
     }
     if constexpr (sizeof...(Parts) == 0) {
-        writeLine(site, [&] { return trace(site.function, site.unit->file, site.line, type); });
+        writeLine(site, [&] { return trace(site.function, site.source->file, site.line, type); });
     } else {
         try {
             const std::string list = parameterList(parts...);
-            writeLine(site, [&] { return tracepara(site.function, site.unit->file, site.line, list.c_str(), type); });
+            writeLine(site, [&] { return tracepara(site.function, site.source->file, site.line, list.c_str(), type); });
         } catch (const std::exception&) {
             return;
         }
@@ -160,17 +160,17 @@ Traced(const CallSite&, Arguments&&...) -> Traced<Arguments...>;
 
 /** Traces a text. */
 [[maybe_unused]] void traceMessage(const CallSite& site, const char* text) noexcept {
-    writeLine(site, [&] { return trace(text, site.unit->file, site.line, MT_MESSAGE); });
+    writeLine(site, [&] { return trace(text, site.source->file, site.line, MT_MESSAGE); });
 }
 
 /** Traces a variable's value. */
 [[maybe_unused]] void traceVariable(const CallSite& site, const char* name, const std::string& value) noexcept {
-    writeLine(site, [&] { return trace(name, site.unit->file, site.line, value.c_str()); });
+    writeLine(site, [&] { return trace(name, site.source->file, site.line, value.c_str()); });
 }
 
 /** Traces a number's value; a flag counts as 1 or 0. */
 [[maybe_unused]] void traceVariable(const CallSite& site, const char* name, unsigned int value) noexcept {
-    writeLine(site, [&] { return trace(name, site.unit->file, site.line, value); });
+    writeLine(site, [&] { return trace(name, site.source->file, site.line, value); });
 }
 
 /** Logs a failure at error level and throws it. */
@@ -218,7 +218,7 @@ constexpr unsigned int exitRuleLine = 349;
 /** Logs the rule and the ENTERING line of an entry point. */
 [[maybe_unused]] void markProviderEntry(const std::string& logger, const char* function, const char* file,
                                         unsigned int line) noexcept {
-    const TraceUnit markers{logger, markerFile};
+    const TraceSource markers{logger, markerFile};
     writeLine({&markers, Level::flow, "markProviderEntry", entryRuleLine}, [] { return requestRule; });
     writeLine({&markers, Level::flow, "markProviderEntry", entryLine},
               [&] { return trace(function, file, line, MT_ENTERING); });
@@ -227,7 +227,7 @@ constexpr unsigned int exitRuleLine = 349;
 /** Logs the EXITING line of an entry point and the rule. */
 [[maybe_unused]] void markProviderExit(const std::string& logger, const char* function, const char* file,
                                        unsigned int line) noexcept {
-    const TraceUnit markers{logger, markerFile};
+    const TraceSource markers{logger, markerFile};
     writeLine({&markers, Level::flow, "markProviderExit", exitLine},
               [&] { return trace(function, file, line, MT_EXITING); });
     writeLine({&markers, Level::flow, "markProviderExit", exitRuleLine}, [] { return requestRule; });

@@ -1,12 +1,12 @@
 #include "Dispatch.h"
 
-#include "Bodies.h"
 #include "CMPIAssetIDDetail.h"
 #include "CMPILease.h"
 #include "CMPILeaseSetting.h"
 #include "CMPIOstrelAgent.h"
 #include "CMPIWarranty.h"
 #include "CMPIWarrantySetting.h"
+#include "Handlers.h"
 #include "KO/ClassIds.h"
 
 #include <algorithm>
@@ -21,7 +21,7 @@ struct DispatchRow {
     std::array<Body, static_cast<std::size_t>(Operation::count)> bodies;
 };
 
-using namespace Bodies;
+using namespace Handlers;
 
 constexpr Body none = &invalidClass;
 

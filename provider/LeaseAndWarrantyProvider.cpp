@@ -10,25 +10,25 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerLeaseAndWarrantyProvider = LoggerNames::kept(LoggerNames::provider);
+std::string loggerLeaseAndWarrantyProvider = LoggerNames::loggerName(LoggerNames::provider);
 
 /** The broker of the latest factory call. */
 const CMPIBroker* broker = nullptr;
 
 namespace {
 
-const TraceUnit unit{loggerLeaseAndWarrantyProvider, "LeaseAndWarrantyProvider.cpp"};
+const TraceSource traceSource{loggerLeaseAndWarrantyProvider, "LeaseAndWarrantyProvider.cpp"};
 
 /** Stands at the head of every dispatched entry point: marks its entry and, when it answers, its exit. */
 class EntryMarkers {
 public:
     explicit EntryMarkers(const CallSite& callSite) : site(callSite), exceptions(std::uncaught_exceptions()) {
-        markProviderEntry(site.unit->logger, site.function, site.unit->file, site.line);
+        markProviderEntry(site.source->logger, site.function, site.source->file, site.line);
     }
 
     ~EntryMarkers() {
         if (std::uncaught_exceptions() == exceptions) {
-            markProviderExit(site.unit->logger, site.function, site.unit->file, site.line);
+            markProviderExit(site.source->logger, site.function, site.source->file, site.line);
         }
     }
 
@@ -81,7 +81,7 @@ CMPIStatus serve(const CallSite& site, Operation operation, Class requestedClass
         }
         bodyOf(operation, classId)(request);
     } catch (const std::exception& failure) {
-        traceMessage(at(unit, Level::error, site.function), failure.what());
+        traceMessage(at(traceSource, Level::error, site.function), failure.what());
     }
     return {request.status.rc, nullptr};
 }
@@ -93,77 +93,77 @@ CMPIStatus note(const CallSite& site, CMPIrc rc) {
 }
 
 CMPIStatus LeaseAndWarranty_Cleanup(CMPIInstanceMI*, const CMPIContext*, CMPIBoolean) {
-    return note(at(unit), CMPI_RC_OK);
+    return note(at(traceSource), CMPI_RC_OK);
 }
 
 CMPIStatus LeaseAndWarranty_EnumInstanceNames(CMPIInstanceMI*, const CMPIContext* ctx, const CMPIResult* result,
                                               const CMPIObjectPath* ref) {
     Request request{broker, ctx, result, ref};
-    return serve(at(unit), Operation::enumInstanceNames, ref, request);
+    return serve(at(traceSource), Operation::enumInstanceNames, ref, request);
 }
 
 CMPIStatus LeaseAndWarranty_EnumInstances(CMPIInstanceMI*, const CMPIContext* ctx, const CMPIResult* result,
                                           const CMPIObjectPath* ref, const char** properties) {
     Request request{broker, ctx, result, ref, properties};
-    return serve(at(unit), Operation::enumInstances, ref, request);
+    return serve(at(traceSource), Operation::enumInstances, ref, request);
 }
 
 CMPIStatus LeaseAndWarranty_GetInstance(CMPIInstanceMI*, const CMPIContext* ctx, const CMPIResult* result,
                                         const CMPIObjectPath* ref, const char** properties) {
     Request request{broker, ctx, result, ref, properties};
-    return serve(at(unit), Operation::getInstance, ref, request);
+    return serve(at(traceSource), Operation::getInstance, ref, request);
 }
 
 CMPIStatus LeaseAndWarranty_CreateInstance(CMPIInstanceMI*, const CMPIContext* ctx, const CMPIResult* result,
                                            const CMPIObjectPath* ref, const CMPIInstance*) {
     Request request{broker, ctx, result, ref};
-    return serve(at(unit), Operation::createInstance, ref, request);
+    return serve(at(traceSource), Operation::createInstance, ref, request);
 }
 
 CMPIStatus LeaseAndWarranty_ModifyInstance(CMPIInstanceMI*, const CMPIContext* ctx, const CMPIResult* result,
                                            const CMPIObjectPath* ref, const CMPIInstance* inst,
                                            const char** properties) {
     Request request{broker, ctx, result, ref, properties, inst};
-    return serve(at(unit), Operation::modifyInstance, ref, request);
+    return serve(at(traceSource), Operation::modifyInstance, ref, request);
 }
 
 CMPIStatus LeaseAndWarranty_DeleteInstance(CMPIInstanceMI*, const CMPIContext* ctx, const CMPIResult* result,
                                            const CMPIObjectPath* ref) {
     Request request{broker, ctx, result, ref};
-    return serve(at(unit), Operation::deleteInstance, ref, request);
+    return serve(at(traceSource), Operation::deleteInstance, ref, request);
 }
 
 CMPIStatus LeaseAndWarranty_ExecQuery(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*,
                                       const char*, const char*) {
-    return note(at(unit), CMPI_RC_ERR_NOT_SUPPORTED);
+    return note(at(traceSource), CMPI_RC_ERR_NOT_SUPPORTED);
 }
 
 CMPIStatus LeaseAndWarranty_AssociationCleanup(CMPIAssociationMI*, const CMPIContext*, CMPIBoolean) {
-    return note(at(unit), CMPI_RC_OK);
+    return note(at(traceSource), CMPI_RC_OK);
 }
 
 CMPIStatus LeaseAndWarranty_Associators(CMPIAssociationMI*, const CMPIContext* ctx, const CMPIResult* result,
                                         const CMPIObjectPath* ref, const char* assocClass, const char*, const char*,
                                         const char*, const char** properties) {
     Request request{broker, ctx, result, ref, properties};
-    return serve(at(unit), Operation::associators, assocClass, request);
+    return serve(at(traceSource), Operation::associators, assocClass, request);
 }
 
 CMPIStatus LeaseAndWarranty_AssociatorNames(CMPIAssociationMI*, const CMPIContext* ctx, const CMPIResult* result,
                                             const CMPIObjectPath* ref, const char* assocClass, const char*, const char*,
                                             const char*) {
     Request request{broker, ctx, result, ref};
-    return serve(at(unit), Operation::associatorNames, assocClass, request);
+    return serve(at(traceSource), Operation::associatorNames, assocClass, request);
 }
 
 CMPIStatus LeaseAndWarranty_References(CMPIAssociationMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*,
                                        const char*, const char*, const char**) {
-    return note(at(unit), CMPI_RC_ERR_NOT_SUPPORTED);
+    return note(at(traceSource), CMPI_RC_ERR_NOT_SUPPORTED);
 }
 
 CMPIStatus LeaseAndWarranty_ReferenceNames(CMPIAssociationMI*, const CMPIContext*, const CMPIResult*,
                                            const CMPIObjectPath*, const char*, const char*) {
-    return note(at(unit), CMPI_RC_ERR_NOT_SUPPORTED);
+    return note(at(traceSource), CMPI_RC_ERR_NOT_SUPPORTED);
 }
 
 CMPIInstanceMIFT instMIFT__{

@@ -5,31 +5,16 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-std::string loggerLeaseBase = LoggerNames::kept(LoggerNames::provider);
+std::string loggerLeaseBase = LoggerNames::loggerName(LoggerNames::provider);
 
 using Property = Properties::Lease;
 
-const TraceUnit LeaseStore::unit{loggerLeaseBase, "LeaseBase.cpp"};
+const TraceSource LeaseStoreTraits::traceSource{loggerLeaseBase, "LeaseBase.cpp"};
 
-const RecordStoreTexts LeaseStore::texts{
-    "LeaseUnit",
-    "LeaseCache",
-    "~LeaseCache",
-    "LeaseBase",
-    "~LeaseBase",
-    "selectLease",
-    "createLease",
-    "deleteLease",
-    "Lease.dat",
-    "recordCountLease",
-    "Zero Lease Records Available",
-    "Lease record not available",
-    "Lease with the supplied instance Id exists.",
-    "Could not open Lease record.",
-};
+const RecordStoreNames LeaseStoreTraits::names{"Lease"};
 
 /** In file order. */
-const std::array<RecordField<LeaseUnit, Property>, 13> LeaseStore::fields{{
+const std::array<RecordField<LeaseUnit, Property>, 13> LeaseStoreTraits::fields{{
     {Property::InstanceID, &LeaseUnit::InstanceID, TextForm::identifier},
     {Property::Lessor, &LeaseUnit::Lessor},
     {Property::BaseTermCommencementDate, &LeaseUnit::BaseTermCommencementDate, TextForm::date},
@@ -45,39 +30,39 @@ const std::array<RecordField<LeaseUnit, Property>, 13> LeaseStore::fields{{
     {Property::NetMonthlyLeaseRateFactor, &LeaseUnit::NetMonthlyLeaseRateFactor},
 }};
 
-template class RecordTrace<LeaseStore>;
-template class RecordCache<LeaseStore>;
-template class RecordBase<LeaseStore>;
+template class RecordTrace<LeaseStoreTraits>;
+template class RecordCache<LeaseStoreTraits>;
+template class RecordBase<LeaseStoreTraits>;
 
 /** Stands below the logger's name and the tables, which its loading uses. */
 LeaseCache LeaseBase::cache;
 
-LeaseCache& LeaseStore::cache() {
+LeaseCache& LeaseStoreTraits::cache() {
     return LeaseBase::cache;
 }
 
 std::ifstream& operator>>(std::ifstream& source, LeaseUnit& lease) {
-    const Traced traced(at(LeaseStore::unit), label::source, &source, label::lease, &lease);
-    readRecord(source, lease, LeaseStore::fields);
+    const Traced traced(at(LeaseStoreTraits::traceSource), label::source, &source, label::lease, &lease);
+    readRecord(source, lease, LeaseStoreTraits::fields);
     return source;
 }
 
 std::size_t bytesOfTexts(const LeaseUnit& lease) {
-    return bytesOfTexts(lease, LeaseStore::fields);
+    return bytesOfTexts(lease, LeaseStoreTraits::fields);
 }
 
 std::ofstream& operator<<(std::ofstream& target, const LeaseUnit& lease) {
-    const Traced traced(at(LeaseStore::unit), label::target, &target, label::lease, &lease);
-    writeRecord(target, lease, LeaseStore::fields);
+    const Traced traced(at(LeaseStoreTraits::traceSource), label::target, &target, label::lease, &lease);
+    writeRecord(target, lease, LeaseStoreTraits::fields);
     return target;
 }
 
 bool LeaseBase::getProperty(Properties::Lease property, bool& value) const {
-    return get(at(LeaseStore::unit), property, value);
+    return get(at(LeaseStoreTraits::traceSource), property, value);
 }
 
 void LeaseBase::setProperty(Properties::Lease property, bool value) {
-    set(at(LeaseStore::unit), property, value, wrongTypeOrProperty);
+    set(at(LeaseStoreTraits::traceSource), property, value, wrongTypeOrProperty);
 }
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -38,22 +38,22 @@ struct LeaseCount {
 };
 
 /** What the design shared with the warranty store needs to know of leases. */
-struct LeaseStore {
+struct LeaseStoreTraits {
     using Unit = LeaseUnit;
     using Count = LeaseCount;
     using Property = Properties::Lease;
 
-    static const TraceUnit unit;
-    static const RecordStoreTexts texts;
+    static const TraceSource traceSource;
+    static const RecordStoreNames names;
     static const std::array<RecordField<Unit, Property>, 13> fields;
-    static RecordCache<LeaseStore>& cache();
+    static RecordCache<LeaseStoreTraits>& cache();
 };
 
 /** The lease table of the process, kept in Lease.dat. */
-using LeaseCache = RecordCache<LeaseStore>;
+using LeaseCache = RecordCache<LeaseStoreTraits>;
 
 /** A cursor over the lease records, with creation and deletion. */
-class LeaseBase : public RecordBase<LeaseStore> {
+class LeaseBase : public RecordBase<LeaseStoreTraits> {
 public:
     void selectLease(const std::string& instanceId) { select(instanceId); }
     bool createLease(const std::string& instanceId) { return create(instanceId); }

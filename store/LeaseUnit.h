@@ -8,12 +8,12 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-struct LeaseStore;
+struct LeaseStoreTraits;
 
 /**
  * The terms of one lease. Money amounts are text; nothing here interprets them.
  */
-struct LeaseUnit : private RecordTrace<LeaseStore> {
+struct LeaseUnit : private RecordTrace<LeaseStoreTraits> {
     LeaseUnit() = default;
     explicit LeaseUnit(const std::string& instanceId) : RecordTrace(instanceId), InstanceID(instanceId) {}
 

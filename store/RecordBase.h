@@ -1,5 +1,6 @@
 #pragma once
 
+#include "FixedString.h"
 #include "Trace.h"
 
 #include <cstddef>
@@ -10,22 +11,38 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-/** What differs in the wording of two record stores: their messages, and their names in the log. */
-struct RecordStoreTexts {
-    const char* unitName;   ///< record type
-    const char* cacheName;  ///< table type, its destructor
-    const char* cacheDestructorName;
-    const char* baseName;  ///< cursor type, its destructor and its operations
-    const char* baseDestructorName;
-    const char* selectName;
-    const char* createName;
-    const char* removeName;
-    const char* fileName;            ///< name of the record file in the agent's data directory
-    const char* countName;           ///< under which the number of records is traced
-    const char* noRecords;           ///< thrown when the count tells of records and there are none
-    const char* notAvailable;        ///< thrown when no record is current
-    const char* identifierExists;    ///< thrown when a record with that identifier exists
-    const char* fileCannotBeOpened;  ///< thrown when the record file cannot be rewritten
+/** The names in the log and the messages of a record store, derived from the kind of its records ("Lease"). */
+struct RecordStoreNames {
+    explicit constexpr RecordStoreNames(const char* kind)
+        : unitName{kind, "Unit"},
+          cacheName{kind, "Cache"},
+          cacheDestructorName{"~", kind, "Cache"},
+          baseName{kind, "Base"},
+          baseDestructorName{"~", kind, "Base"},
+          selectName{"select", kind},
+          createName{"create", kind},
+          removeName{"delete", kind},
+          fileName{kind, ".dat"},
+          countName{"recordCount", kind},
+          noRecords{"Zero ", kind, " Records Available"},
+          notAvailable{kind, " record not available"},
+          identifierExists{kind, " with the supplied instance Id exists."},
+          fileCannotBeOpened{"Could not open ", kind, " record."} {}
+
+    FixedString unitName;  ///< the record type
+    FixedString cacheName;
+    FixedString cacheDestructorName;
+    FixedString baseName;
+    FixedString baseDestructorName;
+    FixedString selectName;
+    FixedString createName;
+    FixedString removeName;
+    FixedString fileName;            ///< of the record file in the agent's data directory
+    FixedString countName;           ///< under which the number of records is traced
+    FixedString noRecords;           ///< thrown if the count is not 0 and no record is in use
+    FixedString notAvailable;        ///< thrown if no record is current
+    FixedString identifierExists;    ///< thrown if a record in use has the identifier
+    FixedString fileCannotBeOpened;  ///< thrown if the record file cannot be rewritten
 };
 
 /**
@@ -33,8 +50,8 @@ struct RecordStoreTexts {
  * loaded once, with the library, and written back by whoever changes it. The count, which each kind
  * names in its own way, is always the number of records in use.
  */
-template <class Policy>
-class RecordCache : public Policy::Count {
+template <class Traits>
+class RecordCache : public Traits::Count {
 public:
     /** Loads the file. Never fails: a file that is absent, unreadable or too large gives an empty table and count 0. */
     RecordCache() noexcept;
@@ -46,7 +63,7 @@ public:
     /** Rewrites the file from the table. Throws InstrumentationException when it cannot be opened. */
     void flushCache();
 
-    std::vector<typename Policy::Unit> table{};  ///< in file order, new records at the end, deleted ones included
+    std::vector<typename Traits::Unit> table{};  ///< in file order, new records at the end, deleted ones included
 
 private:
     /** Releases the records read so far and logs the reason. */
@@ -62,17 +79,17 @@ private:
  * cursor that changed something ends its life. The cursor is an index, so another cursor's append
  * does not disturb it.
  *
- * Policy tells the two apart:
+ * Traits tells the two apart:
  *   Unit, Property     record type and property numbers
  *   Count              base of the table with the record count, to be had from count()
- *   unit, texts        trace unit and RecordStoreTexts of the store
+ *   traceSource, names trace source and RecordStoreNames of the store
  *   fields             its table of RecordField, in file order
  *   cache()            the one table of the process
  */
-template <class Policy>
+template <class Traits>
 class RecordBase {
 public:
-    using Property = typename Policy::Property;
+    using Property = typename Traits::Property;
 
     /**
      * Stands on the first record in use; at the end when the count is 0. Throws InstrumentationException
@@ -130,7 +147,7 @@ protected:
     void set(const CallSite& site, Property property, const Value& value, const char* wrongType);
 
 private:
-    using Unit = typename Policy::Unit;
+    using Unit = typename Traits::Unit;
     static constexpr std::size_t end = std::numeric_limits<std::size_t>::max();
 
     void rewrite(const CallSite& site);

@@ -9,9 +9,9 @@ namespace KO::LeaseWarrantyProvider {
  * record types keep the copying that the compiler writes. Moves, as a growing table makes them, and
  * destruction are not traced.
  *
- * Policy is that of the records' store.
+ * Traits is that of the records' store.
  */
-template <class Policy>
+template <class Traits>
 class RecordTrace {
 public:
     RecordTrace();

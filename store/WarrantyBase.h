@@ -29,22 +29,22 @@ struct WarrantyCount {
 };
 
 /** What the design shared with the lease store needs to know of warranties. */
-struct WarrantyStore {
+struct WarrantyStoreTraits {
     using Unit = WarrantyUnit;
     using Count = WarrantyCount;
     using Property = Properties::Warranty;
 
-    static const TraceUnit unit;
-    static const RecordStoreTexts texts;
+    static const TraceSource traceSource;
+    static const RecordStoreNames names;
     static const std::array<RecordField<Unit, Property>, 4> fields;
-    static RecordCache<WarrantyStore>& cache();
+    static RecordCache<WarrantyStoreTraits>& cache();
 };
 
 /** The warranty table of the process, kept in Warranty.dat. */
-using WarrantyCache = RecordCache<WarrantyStore>;
+using WarrantyCache = RecordCache<WarrantyStoreTraits>;
 
 /** A cursor over the warranty records, with creation and deletion. */
-class WarrantyBase : public RecordBase<WarrantyStore> {
+class WarrantyBase : public RecordBase<WarrantyStoreTraits> {
 public:
     void selectWarranty(const std::string& instanceId) { select(instanceId); }
     bool createWarranty(const std::string& instanceId) { return create(instanceId); }

@@ -8,10 +8,10 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-struct WarrantyStore;
+struct WarrantyStoreTraits;
 
 /** The terms of one warranty. */
-struct WarrantyUnit : private RecordTrace<WarrantyStore> {
+struct WarrantyUnit : private RecordTrace<WarrantyStoreTraits> {
     WarrantyUnit() = default;
     explicit WarrantyUnit(const std::string& instanceId) : RecordTrace(instanceId), InstanceID(instanceId) {}
 

@@ -1,6 +1,6 @@
 #include "KO/Mutex.h"
 
-#include "Exceptions.h"
+#include "KO/Exceptions.h"
 #include "configuration/FileContent.h"
 
 #include <pthread.h>

@@ -1,6 +1,6 @@
 #include "framework/OpenFile.h"
 
-#include "Exceptions.h"
+#include "KO/Exceptions.h"
 #include "KO/File.h"
 #include "KO/Strings.h"
 #include "configuration/FileContent.h"

@@ -1,6 +1,6 @@
 #include "KO/PropertyFile.h"
 
-#include "Exceptions.h"
+#include "KO/Exceptions.h"
 #include "KO/Strings.h"
 #include "configuration/FileContent.h"
 #include "framework/OpenFile.h"

@@ -1,6 +1,6 @@
 #include "KO/File.h"
 
-#include "Exceptions.h"
+#include "KO/Exceptions.h"
 #include "KO/Strings.h"
 #include "agent/TemporaryDirectory.h"
 #include "support/Umask.h"

@@ -1,4 +1,4 @@
-#include "Exceptions.h"
+#include "KO/Exceptions.h"
 
 #include <cxxabi.h>
 #include <dlfcn.h>

@@ -1,6 +1,6 @@
 #include "KO/Mutex.h"
 
-#include "Exceptions.h"
+#include "KO/Exceptions.h"
 
 #include <gmock/gmock.h>
 

@@ -1,6 +1,6 @@
 #include "KO/PropertyFile.h"
 
-#include "Exceptions.h"
+#include "KO/Exceptions.h"
 #include "KO/Strings.h"
 #include "KO/Utils.h"
 #include "agent/TemporaryDirectory.h"

@@ -1,6 +1,6 @@
 #include "framework/ReplacementFile.h"
 
-#include "Exceptions.h"
+#include "KO/Exceptions.h"
 #include "agent/TemporaryDirectory.h"
 #include "support/Umask.h"
 

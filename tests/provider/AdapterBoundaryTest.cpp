@@ -2,7 +2,7 @@
 // operations take the place of the framework's.
 
 #include "CMPIAssetIDDetail.h"
-#include "Exceptions.h"
+#include "KO/Exceptions.h"
 #include "KO/Instrumentation.h"
 #include "KO/ProviderUtilities.h"
 #include "RequestFixture.h"
@@ -46,7 +46,7 @@ using namespace providerTest;
 using testing::ElementsAre;
 using testing::IsEmpty;
 
-using KO::LeaseWarrantyProvider::AssetClass;
+using KO::LeaseWarrantyProvider::AssetAdapterTraits;
 using KO::LeaseWarrantyProvider::AssetIDDetails;
 
 class AssetModificationBoundary : public CleanAgent {};
@@ -56,7 +56,7 @@ TEST_F(AssetModificationBoundary, TakesNoValueThatTheInstanceIsSaidNotToHave) {
           "USER.AssetNumber=A-1\nUSER.Name=Ann\nUSER.PurchaseDate=20250101000000.000000+000\nUSER.Location=Hall\n");
     AssetIDDetails details;
     const CMPIInstance instance{};
-    AssetClass::modify(details, &instance);
+    AssetAdapterTraits::modify(details, &instance);
     const AssetIDDetails reread;
     std::string text;
     EXPECT_TRUE(reread.getAssetNumber(text));

@@ -3,7 +3,7 @@
 
 #include "AssetFileDouble.h"
 #include "AssetSupport.h"
-#include "Exceptions.h"
+#include "KO/Exceptions.h"
 
 #include <gmock/gmock.h>
 

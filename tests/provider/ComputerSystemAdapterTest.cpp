@@ -1,7 +1,7 @@
 // The adapter of the computer end: the instances of another provider, handed out as they are.
 
 #include "CMPIComputerSystem.h"
-#include "Exceptions.h"
+#include "KO/Exceptions.h"
 #include "Support.h"
 
 #include <cmpift.h>

@@ -22,34 +22,34 @@ public:
 template <class Element>
 struct Identifierless {
     using Base = IdentifierlessBase;
-    static inline const KO::TraceUnit& unit = Element::unit;
-    static inline const KO::LeaseWarrantyProvider::RecordElementTexts& texts = Element::texts;
+    static inline const KO::TraceSource& traceSource = Element::traceSource;
+    static inline const KO::LeaseWarrantyProvider::RecordElementNames& names = Element::names;
 };
 
 }  // namespace providerTest
 
 namespace KO::LeaseWarrantyProvider {
 
-template class RecordElement<providerTest::Identifierless<LeaseElement>>;
-template class RecordElement<providerTest::Identifierless<WarrantyElement>>;
+template class RecordElement<providerTest::Identifierless<LeaseElementTraits>>;
+template class RecordElement<providerTest::Identifierless<WarrantyElementTraits>>;
 
 }  // namespace KO::LeaseWarrantyProvider
 
 namespace {
 
 using namespace providerTest;
-using KO::LeaseWarrantyProvider::LeaseElement;
+using KO::LeaseWarrantyProvider::LeaseElementTraits;
 using KO::LeaseWarrantyProvider::RecordElement;
-using KO::LeaseWarrantyProvider::WarrantyElement;
+using KO::LeaseWarrantyProvider::WarrantyElementTraits;
 
 struct IdentifierlessLease {
-    using Element = RecordElement<Identifierless<LeaseElement>>;
+    using Element = RecordElement<Identifierless<LeaseElementTraits>>;
     static constexpr const char* sourceFile = "Lease.cpp";
     static constexpr const char* refusal = "Could not find Instance ID property on Lease.";
 };
 
 struct IdentifierlessWarranty {
-    using Element = RecordElement<Identifierless<WarrantyElement>>;
+    using Element = RecordElement<Identifierless<WarrantyElementTraits>>;
     static constexpr const char* sourceFile = "Warranty.cpp";
     static constexpr const char* refusal = "Could not find Instance ID property on Warranty.";
 };

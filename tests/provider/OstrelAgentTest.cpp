@@ -1,6 +1,6 @@
 #include "OstrelAgent.h"
 
-#include "Exceptions.h"
+#include "KO/Exceptions.h"
 #include "Support.h"
 
 #include <gmock/gmock.h>

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "Exceptions.h"
+#include "KO/Exceptions.h"
 #include "LeaseBase.h"
 #include "Support.h"
 #include "WarrantyBase.h"

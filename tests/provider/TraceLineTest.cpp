@@ -1,6 +1,6 @@
 #include "Trace.h"
 
-#include "Exceptions.h"
+#include "KO/Exceptions.h"
 #include "Support.h"
 
 #include <gmock/gmock.h>
@@ -16,7 +16,7 @@ using testing::ElementsAre;
 using testing::IsEmpty;
 
 const std::string loggerOfTest("Test.Logger");
-const TraceUnit unit{loggerOfTest, "TraceLineTest.cpp"};
+const TraceSource traceSource{loggerOfTest, "TraceLineTest.cpp"};
 
 class TraceLine : public CleanAgent {};
 
@@ -37,7 +37,7 @@ TEST_F(TraceLine, GoesToTheLogChannelAndThenToTheTraceChannel) {
 }
 
 TEST_F(TraceLine, KnowsItsFunctionAndLineFromThePlaceOfTheCall) {
-    traceMethod(at(unit));
+    traceMethod(at(traceSource));
     const unsigned int line = __LINE__ - 1;
     const auto records = agentEnvironment::log();
     ASSERT_EQ(records.size(), 2U);
@@ -49,12 +49,12 @@ TEST_F(TraceLine, KnowsItsFunctionAndLineFromThePlaceOfTheCall) {
 }
 
 TEST_F(TraceLine, KeepsControlCharactersOfATextFromForgingRecords) {
-    traceVariable(at(unit), "value", std::string("one\ntwo\tthree"));
+    traceVariable(at(traceSource), "value", std::string("one\ntwo\tthree"));
     EXPECT_THAT(texts(), ElementsAre(variable("value", "one\\ntwo\\tthree", "TraceLineTest.cpp")));
 }
 
 TEST_F(TraceLine, ShowsAFlagAsANumber) {
-    traceVariable(at(unit), "flag", true);
+    traceVariable(at(traceSource), "flag", true);
     EXPECT_THAT(texts(), ElementsAre(variable("flag", "1", "TraceLineTest.cpp")));
 }
 
@@ -77,8 +77,8 @@ TEST_F(TraceLine, IsCutAt511Characters) {
 enum class Colour : int { green = 6 };
 
 TEST_F(TraceLine, ShowsTheValuesOfAParameterListBehindTheirLabels) {
-    traceLine(at(unit), MT_MESSAGE, label::property, Colour::green, label::value, std::string("a b"), label::instanceId,
-              "text", label::filterTypeBare, 4294967295U);
+    traceLine(at(traceSource), MT_MESSAGE, label::property, Colour::green, label::value, std::string("a b"),
+              label::instanceId, "text", label::filterTypeBare, 4294967295U);
     EXPECT_THAT(texts(), ElementsAre("MESSAGE [File: TraceLineTest.cpp, Line: N]: TestBody,Parameters List:  "
                                      "property=6 value=a b instanceId=textFilterType=4294967295"));
 }
@@ -86,7 +86,7 @@ TEST_F(TraceLine, ShowsTheValuesOfAParameterListBehindTheirLabels) {
 TEST_F(TraceLine, ShowsAPointerAsAnAddress) {
     const int target = 0;
     const void* const nothing = nullptr;
-    traceLine(at(unit), MT_ENTERING, label::broker, &target, label::context, nothing);
+    traceLine(at(traceSource), MT_ENTERING, label::broker, &target, label::context, nothing);
     std::ostringstream address;
     address << &target;
     EXPECT_THAT(texts(),
@@ -94,8 +94,8 @@ TEST_F(TraceLine, ShowsAPointerAsAnAddress) {
 }
 
 void leaveNormally() {
-    const Traced traced(at(unit));
-    traceMethod(at(unit));
+    const Traced traced(at(traceSource));
+    traceMethod(at(traceSource));
 }
 
 TEST_F(TraceLine, MarksEntryAndExitOfAFunction) {
@@ -107,7 +107,7 @@ TEST_F(TraceLine, MarksEntryAndExitOfAFunction) {
 }
 
 void change(std::string& value) {
-    const Traced traced(at(unit, Level::error), label::value, value);
+    const Traced traced(at(traceSource, Level::error), label::value, value);
     value = "after";
 }
 
@@ -120,7 +120,7 @@ TEST_F(TraceLine, ReadsTheParametersAgainAtExit) {
 }
 
 void nameAsGiven() {
-    const Traced traced(at(unit, Level::flow, "~Name"), label::value, std::string("kept until the exit"));
+    const Traced traced(at(traceSource, Level::flow, "~Name"), label::value, std::string("kept until the exit"));
 }
 
 TEST_F(TraceLine, KeepsTemporaryParametersUntilTheExit) {
@@ -130,8 +130,8 @@ TEST_F(TraceLine, KeepsTemporaryParametersUntilTheExit) {
 }
 
 void leaveByException() {
-    const Traced traced(at(unit));
-    fail<FrameworkException>(at(unit), "It failed.");
+    const Traced traced(at(traceSource));
+    fail<FrameworkException>(at(traceSource), "It failed.");
 }
 
 TEST_F(TraceLine, MarksNoExitWhenAnExceptionLeaves) {
@@ -141,7 +141,7 @@ TEST_F(TraceLine, MarksNoExitWhenAnExceptionLeaves) {
 }
 
 void swallow() {
-    const Traced traced(at(unit));
+    const Traced traced(at(traceSource));
     try {
         throw ProviderException("swallowed");
     } catch (const ProviderException&) {
@@ -170,7 +170,7 @@ TEST_F(TraceLine, MarksTheExitOfAFunctionThatRunsWhileAnExceptionLeaves) {
 
 TEST_F(TraceLine, TellsAFailureAtErrorLevelBeforeItIsThrown) {
     EXPECT_EQ(thrown<InstrumentationException>(
-                  [] { fail<InstrumentationException>(at(unit, Level::flow, "find"), "Not there"); }),
+                  [] { fail<InstrumentationException>(at(traceSource, Level::flow, "find"), "Not there"); }),
               "Not there");
     const auto records = recordsOf("TraceLineTest.cpp", "find");
     ASSERT_EQ(records.size(), 1U);

@@ -14,7 +14,7 @@ using testing::ElementsAre;
 using testing::IsEmpty;
 
 const std::string loggerOfTest("Test.Logger");
-const TraceUnit unit{loggerOfTest, "Unit.cpp"};
+const TraceSource traceSource{loggerOfTest, "Unit.cpp"};
 
 /** A value that counts how often it is shown. */
 struct Shown {

@@ -11,7 +11,7 @@ using namespace KO;
 using testing::ElementsAre;
 
 const std::string loggerOfTest("Test.Logger");
-const TraceUnit unit{loggerOfTest, "Unit.cpp"};
+const TraceSource traceSource{loggerOfTest, "Unit.cpp"};
 
 TEST(TraceUnasked, GivesEveryLineWhateverItsLevel) {
     { const Traced traced(CallSite{&unit, 10000, "work", 7}, label::value, 5); }

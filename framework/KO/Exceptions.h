@@ -8,10 +8,10 @@
 namespace KO {
 
 /**
- * The shape that the system's exceptions share: an English message, fixed where it is thrown.
+ * Declares an exception with an English message.
  *
- * They are thrown by value, caught by reference, and cross the borders of the provider, the
- * framework and the logging library; hence their default visibility.
+ * The exceptions are thrown by value and caught by reference, across the borders of the provider, the framework and
+ * the logging library. Their visibility is therefore the default one.
  */
 #define KO_EXCEPTION_CLASS(Name)                                               \
     class KO_EXPORT Name : public std::exception {                             \
@@ -21,20 +21,20 @@ namespace KO {
         Name& operator=(const Name&) = default;                                \
         ~Name() override = default;                                            \
                                                                                \
-        /** The message; valid as long as the exception. */                    \
+        /** The message. Valid as long as the exception. */                    \
         const char* what() const noexcept override { return message.c_str(); } \
                                                                                \
     private:                                                                   \
         std::string message;                                                   \
     }
 
-/** A record or node of the managed system is missing or is asked for something it has not. */
+/** A record or a node of the managed system is missing, or has no such property. */
 KO_EXCEPTION_CLASS(InstrumentationException);
 
-/** An operation of the agent framework failed, or was given what it cannot work on. */
+/** An operation of the agent framework failed, or its argument is not usable. */
 KO_EXCEPTION_CLASS(FrameworkException);
 
-/** The provider cannot get what it needs from the object manager. */
+/** The object manager did not return what the provider needs. */
 KO_EXCEPTION_CLASS(ProviderException);
 
 #undef KO_EXCEPTION_CLASS

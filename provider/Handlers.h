@@ -9,7 +9,7 @@
  * What each operation does with the adapter of a class. An adapter's results go to the object
  * manager as they come; a null path or instance is passed over.
  */
-namespace KO::LeaseWarrantyProvider::Bodies {
+namespace KO::LeaseWarrantyProvider::Handlers {
 
 inline void give(const CMPIResult* result, const CMPIInstance* instance) {
     if (instance != nullptr) {
@@ -86,4 +86,4 @@ inline void invalidClass(Request& request) {
     request.status.rc = CMPI_RC_ERR_INVALID_CLASS;
 }
 
-}  // namespace KO::LeaseWarrantyProvider::Bodies
+}  // namespace KO::LeaseWarrantyProvider::Handlers
