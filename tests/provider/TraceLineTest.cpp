@@ -21,7 +21,7 @@ const TraceSource traceSource{loggerOfTest, "TraceLineTest.cpp"};
 class TraceLine : public CleanAgent {};
 
 TEST_F(TraceLine, GoesToTheLogChannelAndThenToTheTraceChannel) {
-    traceMessage({&unit, Level::error, "aFunction", 17}, "a text");
+    traceMessage({&traceSource, Level::error, "aFunction", 17}, "a text");
     const auto records = agentEnvironment::log();
     ASSERT_EQ(records.size(), 2U);
     EXPECT_EQ(records[0].channel, "log");
@@ -59,13 +59,13 @@ TEST_F(TraceLine, ShowsAFlagAsANumber) {
 }
 
 TEST_F(TraceLine, IsLostWithoutHarmWhenItsLevelIsNotAdmitted) {
-    traceMessage({&unit, 10000, "aFunction", 1}, "a text");
+    traceMessage({&traceSource, 10000, "aFunction", 1}, "a text");
     EXPECT_THAT(agentEnvironment::log(), IsEmpty());
 }
 
 TEST_F(TraceLine, IsCutAt511Characters) {
     const std::string longList(600, 'x');
-    traceLine({&unit, Level::flow, "f", 1}, MT_ENTERING, label::value, longList);
+    traceLine({&traceSource, Level::flow, "f", 1}, MT_ENTERING, label::value, longList);
     const auto shown = texts();
     ASSERT_EQ(shown.size(), 1U);
     const std::string head = "ENTERING: f() in TraceLineTest.cpp [Line: 1],Parameters List:  value=";

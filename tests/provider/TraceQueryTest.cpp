@@ -34,7 +34,7 @@ protected:
     }
 
     void traceEverything() {
-        const CallSite site{&unit, Level::flow, "work", 7};
+        const CallSite site{&traceSource, Level::flow, "work", 7};
         const Traced traced(site, label::value, Shown{timesShown});
         traceMethod(site);
         traceVariable(site, "name", std::string("text"));
@@ -63,7 +63,7 @@ TEST_F(TraceQuery, GivesEveryLineThatIsAdmitted) {
 
 TEST_F(TraceQuery, AsksForTheLevelOfEachLine) {
     logDouble::admittedLevel = Level::error;
-    const CallSite site{&unit, Level::flow, "work", 7};
+    const CallSite site{&traceSource, Level::flow, "work", 7};
     EXPECT_THROW(fail<std::runtime_error>(site, "It failed."), std::runtime_error);
     EXPECT_THAT(logDouble::records, ElementsAre("log MESSAGE [File: Unit.cpp, Line: 7]: It failed.",
                                                 "trace MESSAGE [File: Unit.cpp, Line: 7]: It failed."));
@@ -72,7 +72,7 @@ TEST_F(TraceQuery, AsksForTheLevelOfEachLine) {
 TEST_F(TraceQuery, MarksNoExitOfWhatWasNotSeenToBeEntered) {
     logDouble::admittedLevel = Level::error;
     {
-        const Traced traced(CallSite{&unit, Level::flow, "work", 7});
+        const Traced traced(CallSite{&traceSource, Level::flow, "work", 7});
         logDouble::admittedLevel = Level::flow;
     }
     EXPECT_THAT(logDouble::records, IsEmpty());

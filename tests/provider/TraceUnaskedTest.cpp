@@ -14,7 +14,7 @@ const std::string loggerOfTest("Test.Logger");
 const TraceSource traceSource{loggerOfTest, "Unit.cpp"};
 
 TEST(TraceUnasked, GivesEveryLineWhateverItsLevel) {
-    { const Traced traced(CallSite{&unit, 10000, "work", 7}, label::value, 5); }
+    { const Traced traced(CallSite{&traceSource, 10000, "work", 7}, label::value, 5); }
     EXPECT_THAT(logDouble::records,
                 ElementsAre("log ENTERING: work() in Unit.cpp [Line: 7],Parameters List:  value=5",
                             "trace ENTERING: work() in Unit.cpp [Line: 7],Parameters List:  value=5",
