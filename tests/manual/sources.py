@@ -6,6 +6,9 @@ from pages import ROOT
 
 TOKEN = re.compile(r'//[^\n]*|/\*.*?\*/|#include[^\n]*|static_assert\([^;]*;'
                    r'|\'(?:\\.|[^\'\\\n])\'|"(?:\\.|[^"\\\n])*"', re.S)
+# Names and messages that the lease and the warranty side derive from one word.
+KINDS = ("Lease", "Warranty")
+DERIVED = re.compile(r'\{((?:"[^"]*"|kind|className)(?:, (?:"[^"]*"|kind|className))+)\}')
 ESCAPES = {"n": "\n", "r": "\r", "t": "\t", "0": "\0"}
 
 
@@ -14,9 +17,17 @@ def files(*folders):
     return [path for path in found if path.suffix in (".cpp", ".h")]
 
 
+def derived(match):
+    """The strings that a FixedString has for each kind of records, as literals."""
+    pieces = match[1].split(", ")
+    return ", ".join('"' + "".join(kind if piece in ("kind", "className") else piece.strip('"') for piece in pieces)
+                     + '"' for kind in KINDS)
+
+
 def literals(text):
     """The literals of a source in their order, those that stand together as one."""
     found, end = [], None
+    text = DERIVED.sub(derived, text)
     for token in TOKEN.finditer(text):
         if not token[0].startswith('"'):
             continue
