@@ -26,8 +26,8 @@ using namespace Handlers;
 constexpr Body none = &invalidClass;
 
 /**
- * Class id, then the bodies in the order of Operation. Instances of an association class are enumerated
- * but, on purpose, cannot be got.
+ * Class id, then the handlers in the order of Operation. GetInstance of an association class is deliberately not
+ * supported.
  */
 constexpr std::array<DispatchRow, 6> dispatchTable{{
     // clang-format off

@@ -6,7 +6,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-/** The operations that are dispatched by class, in the order of the dispatch table's columns. */
+/** Operations that are dispatched by class, in the order of the dispatch table's columns. */
 enum class Operation : std::size_t {
     enumInstanceNames,
     enumInstances,
@@ -19,10 +19,10 @@ enum class Operation : std::size_t {
     count,
 };
 
-/** What an operation does for a class: drives the class's adapter, or sets the request's status. */
+/** Handler of an operation for a class. Calls the class's adapter or sets the request's status. */
 using Body = void (*)(Request&);
 
-/** The body of an operation for a class id; that of an invalid class where the class is not served. */
+/** Returns the handler of an operation for a class id; &Handlers::invalidClass for other classes. */
 Body bodyOf(Operation operation, unsigned short classId);
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -6,8 +6,7 @@
 #include <cmpift.h>
 
 /**
- * What each operation does with the adapter of a class. An adapter's results go to the object
- * manager as they come; a null path or instance is passed over.
+ * Handlers of the operations. They pass the adapter's results to the object manager one by one and skip null pointers.
  */
 namespace KO::LeaseWarrantyProvider::Handlers {
 
@@ -23,7 +22,9 @@ inline void give(const CMPIResult* result, const CMPIObjectPath* path) {
     }
 }
 
-/** Walks the adapter of the request's path, gives what `take` takes at each step, and ends the answer. */
+/**
+ * Iterates over the adapter of the request's path, returns the result of `take` for each element, and calls returnDone.
+ */
 template <class Adapter, class Take>
 void walk(const Request& request, Take take) {
     static_assert(AdapterContract::fulfilled<Adapter>);
@@ -55,7 +56,7 @@ void associatorNames(Request& request) {
     walk<Adapter>(request, [](Adapter& adapter) { return adapter.getAssociatorNames(); });
 }
 
-/** The new record's key comes from the path; the answer is the instance, not its path. */
+/** Takes the new record's key from the path. Returns the new instance, not its path. */
 template <class Adapter>
 void create(Request& request) {
     static_assert(AdapterContract::creates<Adapter>);
@@ -64,14 +65,14 @@ void create(Request& request) {
     request.result->ft->returnDone(request.result);
 }
 
-/** Gives nothing to the result, not even its end. */
+/** Returns no result and does not call returnDone. */
 template <class Adapter>
 void modify(Request& request) {
     Adapter adapter(request.broker, request.context, request.path);
     adapter.modifyCMPIInstance(request.instance, request.properties);
 }
 
-/** Gives nothing to the result, not even its end. */
+/** Returns no result and does not call returnDone. */
 template <class Adapter>
 void remove(Request& request) {
     Adapter adapter(request.broker, request.context, request.path);

@@ -12,14 +12,14 @@ namespace KO::LeaseWarrantyProvider {
 
 std::string loggerLeaseAndWarrantyProvider = LoggerNames::loggerName(LoggerNames::provider);
 
-/** The broker of the latest factory call. */
+/** Broker of the latest factory call. */
 const CMPIBroker* broker = nullptr;
 
 namespace {
 
 const TraceSource traceSource{loggerLeaseAndWarrantyProvider, "LeaseAndWarrantyProvider.cpp"};
 
-/** Stands at the head of every dispatched entry point: marks its entry and, when it answers, its exit. */
+/** Logs the entry of a dispatched entry point and, unless an exception leaves it, the exit. */
 class EntryMarkers {
 public:
     explicit EntryMarkers(const CallSite& callSite) : site(callSite), exceptions(std::uncaught_exceptions()) {
@@ -40,7 +40,7 @@ private:
     int exceptions;
 };
 
-/** The class id of a request's path or association class, as the log shows it. */
+/** Returns and traces the class id of a request's path or association class. */
 template <class Class>
 unsigned short classIdOf(const CallSite& site, Class requestedClass) {
     const unsigned short classId = ProviderUtilities::getClassId(requestedClass);
@@ -48,10 +48,7 @@ unsigned short classIdOf(const CallSite& site, Class requestedClass) {
     return classId;
 }
 
-/**
- * The namespace in which a new instance is named. The status that the request will answer is
- * written by the two calls and stays as they left it.
- */
+/** Returns the namespace of a new instance. Both calls write the status that the request returns. */
 std::string nameSpaceOf(const CMPIObjectPath* ref, CMPIStatus& status) {
     if (ref == nullptr) {
         return {};
@@ -65,11 +62,10 @@ std::string nameSpaceOf(const CMPIObjectPath* ref, CMPIStatus& status) {
 }
 
 /**
- * Runs an operation's body for the class of a path or of a name, between the marks of the entry point.
- * What is thrown is only logged: the object manager sees the status as it stood, normally success, with
- * whatever was returned before. Exceptions of other kinds than std::exception leave the provider. Only
- * the status's code is answered: a message that a failing call of the broker put beside it is not the
- * provider's.
+ * Runs the handler of an operation for the class of a path or a class name, between the markers of the entry point.
+ * Exceptions derived from std::exception are only logged: the object manager receives the current status, normally
+ * CMPI_RC_OK, and the results returned so far. Other exceptions leave the provider. The returned status has no message,
+ * since a message that a failing broker call wrote does not belong to the provider.
  */
 template <class Class>
 CMPIStatus serve(const CallSite& site, Operation operation, Class requestedClass, Request& request) {
@@ -86,7 +82,7 @@ CMPIStatus serve(const CallSite& site, Operation operation, Class requestedClass
     return {request.status.rc, nullptr};
 }
 
-/** The answer of an operation that is only noted. */
+/** Traces the call of an operation without a handler and returns its fixed status. */
 CMPIStatus note(const CallSite& site, CMPIrc rc) {
     traceMethod(site);
     return {rc, nullptr};

@@ -6,9 +6,9 @@
 #include <cmpift.h>
 
 /**
- * The library's two factories, which the object manager finds by name. Each remembers the broker,
- * which all requests use from then on, and returns the library's one interface object of its kind.
- * They may be called repeatedly. The context is not used, and rc is not written.
+ * The library's two factories, which the object manager looks up by name. Each stores the broker for all later requests
+ * and returns the library's only interface object of its kind. They can be called repeatedly. They do not use the
+ * context and do not write rc.
  */
 extern "C" {
 

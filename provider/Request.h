@@ -6,15 +6,15 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-/** One request of the object manager: what it passed, all of it borrowed, and the status it will get. */
+/** A request of the object manager: its arguments, all borrowed, and the status to return. */
 struct Request {
     const CMPIBroker* broker;
     const CMPIContext* context;
     const CMPIResult* result;
     const CMPIObjectPath* path;
     const char** properties = nullptr;       ///< property list, null for all
-    const CMPIInstance* instance = nullptr;  ///< of a modification
-    std::string nameSpace{};                 ///< of a creation
+    const CMPIInstance* instance = nullptr;  ///< of ModifyInstance
+    std::string nameSpace{};                 ///< of CreateInstance
     CMPIStatus status{CMPI_RC_OK, nullptr};
 };
 
