@@ -5,8 +5,8 @@
 #include <optional>
 #include <string>
 
-// Calls of CMPI objects that belong to an object manager. Managers leave functions out of their tables and return null
-// pointers, so nothing here relies on either.
+// Safe calls to CMPI objects of an object manager. Managers leave functions out of their tables and return null
+// pointers, so these functions check both.
 
 namespace cim {
 
@@ -32,7 +32,7 @@ auto ask(Object* object, Arguments... arguments) {
     return Answer<Value>{value, status};
 }
 
-/** Calls a function of an object's table that returns a status. */
+/** Calls one of the broker's functions that create objects. Returns null if the status is an error. */
 template <auto function, class Object, class... Arguments>
 CMPIStatus tell(Object* object, Arguments... arguments) {
     if (object == nullptr || object->ft == nullptr || object->ft->*function == nullptr) {
@@ -53,32 +53,32 @@ auto make(const CMPIBroker* broker, Arguments... arguments) {
     return status.rc == CMPI_RC_OK ? object : Object{};
 }
 
-/** The characters of a string; none if any part of it is missing. */
+/** Returns the characters of a string, or none if the string, its table or its characters are missing. */
 inline std::optional<std::string> charactersOf(const CMPIString* string) {
     const char* characters = ask<&CMPIStringFT::getCharPtr>(string).value;
     return characters != nullptr ? std::optional<std::string>(characters) : std::nullopt;
 }
 
-// What the object managers put into the state of a CMPIData decides how each place is read:
+// Object managers set CMPIData::state differently, so each source of data is read in its own way:
 //
 //   getKey, getKeyAt, getProperty, getPropertyAt
 //       Both managers set the state: CMPI_nullValue for a value that is not set, CMPI_notFound (with an error status)
-//       for a name that does not exist, CMPI_keyValue for a key. SFCB gives a null string a pointer to a string object
-//       without characters, and a missing property the state CMPI_notFound alone. So: the status, then the state, then
-//       the type, then the pointer, then the characters. See hasValue().
+//       for a name that does not exist, CMPI_keyValue for a key. For a null string, SFCB returns a pointer to a string
+//       object without characters; for a missing property, only the state CMPI_notFound. Check in this order: status,
+//       state, type, pointer, characters. See hasValue().
 //   getNext
-//       OpenPegasus returns every element with the state CMPI_nullValue; SFCB with CMPI_goodValue. So: the status, then
-//       the type, then the pointer, and never the state. See elementInstance().
+//       OpenPegasus returns every element with the state CMPI_nullValue, SFCB with CMPI_goodValue. Check the status,
+//       the type and the pointer, but never the state. See elementInstance().
 //   Context entries
-//       are not read by the provider, the gate or the agent.
+//       The provider, the gate and the agent do not read them.
 
-/** Whether the data of a key or a property holds a value. That it is the value of a key is no flaw. */
+/** Returns whether the data of a key or a property contain a value. CMPI_keyValue is not an error. */
 inline bool hasValue(const CMPIData& data) {
     constexpr unsigned int flaws = CMPI_nullValue | CMPI_notFound | CMPI_badValue;
     return (data.state & flaws) == 0 && data.type != CMPI_null;
 }
 
-/** The instance that an enumeration returned, whatever its state; null if the element is not an instance. */
+/** Returns the instance of an enumeration element, regardless of its state; null if the element is not an instance. */
 inline CMPIInstance* elementInstance(const CMPIData& element) {
     return element.type == CMPI_instance ? element.value.inst : nullptr;
 }
