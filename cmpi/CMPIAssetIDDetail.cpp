@@ -15,7 +15,7 @@ namespace {
 
 using A = AssetIDDetails;
 
-/** The properties of one personalized pair. */
+/** Property names of a personalized pair. */
 struct PairProperties {
     const char* label;
     const char* data;
@@ -29,7 +29,7 @@ constexpr std::array<PairProperties, A::pairCount> pairProperties{{
     {"PersonalizedLabel5", "PersonalizedData5"},
 }};
 
-/** All ten properties of the pairs, or none unless there are exactly five. */
+/** Sets all ten properties of the pairs, or none unless there are exactly five pairs. */
 void fillPairs(const A& details, InstanceBuilder& builder, const char*) {
     std::vector<A::PersonalizedPair> pairs;
     if (!details.getPersonalizedData(pairs) || pairs.size() != pairProperties.size()) {
@@ -43,7 +43,7 @@ void fillPairs(const A& details, InstanceBuilder& builder, const char*) {
     }
 }
 
-/** Replaces the text by the property's value, if the instance has it. */
+/** Replaces the string by the property's value if the instance has the property. */
 void takeText(const CMPIInstance* instance, const char* name, std::string& text) {
     std::string value;
     if (ProviderUtilities::getProperty(instance, name, value, false)) {
@@ -51,7 +51,7 @@ void takeText(const CMPIInstance* instance, const char* name, std::string& text)
     }
 }
 
-/** Always five pairs: one that the instance does not carry repeats the one before it. */
+/** Sets all five pairs. A label or data property that the instance lacks repeats the preceding one. */
 void modifyPairs(A& details, const CMPIInstance* instance) {
     std::string label;
     std::string data;
@@ -64,14 +64,14 @@ void modifyPairs(A& details, const CMPIInstance* instance) {
     details.setPersonalizedData(pairs);
 }
 
-/** A property that a client may change. */
+/** A property that clients can modify. */
 struct Modification {
     const char* name;
     bool isDateTime;
     void (A::*set)(const std::string& value);
 };
 
-/** What follows the asset number and the pairs, in the order in which it is taken. */
+/** Properties that are set after the asset number and the pairs, in this order. */
 constexpr std::array<Modification, 9> modifications{{
     {"PrimaryOwnerName", false, &A::setOwnerName},
     {"PrimaryOwnerPhone", false, &A::setOwnerPhone},
@@ -102,7 +102,7 @@ const std::array<KeyRow<A>, 4> AssetAdapterTraits::keys{{
     key<A, &A::getVersion>("Version"),
 }};
 
-/** Neither in the order of the keys nor in that of the types. */
+/** The order is neither that of the keys nor that of the filter types. */
 const std::array<KeyFilter<A>, 4> AssetAdapterTraits::filters{{
     {"Name", A::FILTER_NAME},
     {"IdentifyingNumber", A::FILTER_IDENTIFYING_NUMBER},
@@ -110,7 +110,7 @@ const std::array<KeyFilter<A>, 4> AssetAdapterTraits::filters{{
     {"Version", A::FILTER_VERSION},
 }};
 
-/** Changes are a table of their own, above: they are taken in another order than an instance is filled. */
+/** Modifications use a separate table, since they are applied in a different order. */
 const std::array<PropertyRow<A>, 24> AssetAdapterTraits::properties{{
     readOnly<A, &A::getIdentifyingNumber>("IdentifyingNumber"),
     readOnly<A, &A::getName, ValueForm::typed, Presence::always>("Name"),

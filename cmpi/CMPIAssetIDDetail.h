@@ -9,7 +9,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-/** The CIM class VELKO_AssetIDDetails: what the design shared with VELKO_OstrelAgent needs to know of it. */
+/** Traits of VELKO_AssetIDDetails for ProductAdapter. */
 struct AssetAdapterTraits {
     using Element = AssetIDDetails;
     static constexpr const char* className = "VELKO_AssetIDDetails";
@@ -22,13 +22,13 @@ struct AssetAdapterTraits {
     static const std::array<PropertyRow<AssetIDDetails>, 24> properties;
 
     /**
-     * Takes the modifiable properties that the instance has, and writes the asset file, whatever was read of
-     * it and whether or not the path's keys select a computer.
+     * Sets the modifiable properties that the instance has and writes the asset file. Writes it even if it could not be
+     * read or the path's keys select no computer.
      */
     static void modify(AssetIDDetails& details, const CMPIInstance* instance);
 };
 
-/** The adapter of VELKO_AssetIDDetails. */
+/** Adapter of VELKO_AssetIDDetails. */
 using CMPIAssetIDDetail = ProductAdapter<AssetAdapterTraits>;
 
 extern template class ElementAdapter<AssetAdapterTraits>;

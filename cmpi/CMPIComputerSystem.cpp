@@ -34,7 +34,7 @@ bool CMPILAWComputerSystem::hasNext() const {
     return enumeration != nullptr && enumeration->ft->hasNext(enumeration, &status) == 1;
 }
 
-/** Makes the enumeration's next instance the current one; on failure the current one stays as it is. */
+/** Makes the enumeration's next instance current. On failure, keeps the current one. */
 bool CMPILAWComputerSystem::takeNext() {
     CMPIStatus status{CMPI_RC_OK, nullptr};
     const CMPIData next = enumeration->ft->getNext(enumeration, &status);

@@ -7,13 +7,13 @@
 namespace KO::LeaseWarrantyProvider {
 
 /**
- * The computer end of the setting associations. Computer systems are served by another provider: the
- * adapter asks the object manager for their instances, walks them, and hands them out unchanged.
- * They belong to the object manager, like the enumeration, and live until the request ends.
+ * Adapter of the computer end of the setting associations. Another provider serves computer systems: the adapter
+ * enumerates them through the broker and returns their instances unchanged. The object manager owns the instances and
+ * the enumeration, which are valid until the request ends.
  */
 class CMPILAWComputerSystem {
 public:
-    /** Stands on no instance until setObjectPath. */
+    /** Creates an adapter without a current instance. */
     CMPILAWComputerSystem(const CMPIBroker* requestBroker, const CMPIContext* requestContext,
                           std::string requestNameSpace);
     ~CMPILAWComputerSystem();
@@ -21,26 +21,26 @@ public:
     CMPILAWComputerSystem& operator=(const CMPILAWComputerSystem&) = delete;
 
     /**
-     * Has the instances of the path's class enumerated, in its namespace and without regard to its
-     * keys, and stands on the first. Throws ProviderException when there is none to be had, also for a
-     * null path, which the object manager is not asked about. Stands on none when what comes first is no
-     * instance.
+     * Enumerates the instances of the path's class in its namespace, ignoring its keys, and makes the first one
+     * current. If that element is not an instance, there is no current instance. Does not call the broker if the path
+     * is null.
+     * @throws ProviderException if the path is null, the enumeration fails or has no element
      */
     void setObjectPath(const CMPIObjectPath* path);
 
     /**
-     * Whether a further instance waits behind the current one. A loop that tests this before using
-     * the current instance therefore never sees the last one; the associations are built on that.
+     * Returns whether there is an instance after the current one. A loop that checks this first therefore skips the
+     * last instance; the associations depend on that.
      */
     operator bool();
 
-    /** Moves to the next instance; to none when that cannot be had. */
+    /** Moves to the next instance. If getNext fails, there is no current instance. */
     void operator++();
 
-    /** Path of the current instance; null when there is none or it does not tell. */
+    /** Returns the path of the current instance; null if there is none or it does not return its path. */
     CMPIObjectPath* getObjectPath();
 
-    /** The current instance, with all its properties; null when there is none. */
+    /** Returns the current instance with all properties; null if there is none. */
     CMPIInstance* getCMPIInstance(const char** properties);
 
 private:

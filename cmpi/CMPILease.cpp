@@ -11,7 +11,7 @@ const TraceSource LeaseAdapterTraits::traceSource{loggerCMPILease, "CMPILease.cp
 
 using L = Lease;
 
-/** In the order in which an instance is filled. */
+/** In the order in which instances are filled. */
 const std::array<PropertyRow<L>, 18> LeaseAdapterTraits::properties{{
     readOnly<L, &L::getCaption>("Caption"),
     readOnly<L, &L::getDescription>("Description"),

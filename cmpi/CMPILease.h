@@ -8,7 +8,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-/** The CIM class VELKO_Lease: what the design shared with VELKO_Warranty needs to know of it. */
+/** Traits of VELKO_Lease for RecordAdapter. */
 struct LeaseAdapterTraits {
     using Element = Lease;
     static constexpr const char* className = "VELKO_Lease";
@@ -21,7 +21,7 @@ struct LeaseAdapterTraits {
     static const std::array<PropertyRow<Lease>, 18> properties;
 };
 
-/** The adapter of VELKO_Lease. */
+/** Adapter of VELKO_Lease. */
 using CMPILease = RecordAdapter<LeaseAdapterTraits>;
 
 extern template class ElementAdapter<LeaseAdapterTraits>;

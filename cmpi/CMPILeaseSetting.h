@@ -7,7 +7,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-/** The CIM class VELKO_LeaseSetting: what the shared design of the setting associations needs to know of it. */
+/** Traits of VELKO_LeaseSetting for SettingAdapter. */
 struct LeaseSettingAdapterTraits {
     using Element = CMPILease;
     using Setting = LeaseSetting;
@@ -25,12 +25,14 @@ struct LeaseSettingAdapterTraits {
 
 extern template class SettingAdapter<LeaseSettingAdapterTraits>;
 
-/** The adapter of VELKO_LeaseSetting. */
+/** Adapter of VELKO_LeaseSetting. */
 class CMPILeaseSetting : public SettingAdapter<LeaseSettingAdapterTraits> {
 public:
     using SettingAdapter::SettingAdapter;
 
-    /** Path that a computer's lease would have; without keys if the computer's path has none. */
+    /**
+     * Returns the path of a computer's lease, whether or not it exists; without keys if the computer's path has none.
+     */
     CMPIObjectPath* locateLease(const CMPIObjectPath* computerPath) { return locateElement(computerPath); }
 };
 

@@ -19,7 +19,7 @@ const std::array<KeyRow<A>, 5> AgentAdapterTraits::keys{{
     key<A, &A::getVersion>("Version"),
 }};
 
-/** The order of the keys is not that of the types. */
+/** The order differs from that of the filter types. */
 const std::array<KeyFilter<A>, 5> AgentAdapterTraits::filters{{
     {"Name", A::FILTER_NAME},
     {"IdentifyingNumber", A::FILTER_IDENTIFYING_NUMBER},

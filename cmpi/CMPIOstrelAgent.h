@@ -9,7 +9,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-/** The CIM class VELKO_OstrelAgent: what the design shared with VELKO_AssetIDDetails needs to know of it. */
+/** Traits of VELKO_OstrelAgent for ProductAdapter. */
 struct AgentAdapterTraits {
     using Element = OstrelAgent;
     static constexpr const char* className = "VELKO_OstrelAgent";
@@ -22,7 +22,7 @@ struct AgentAdapterTraits {
     static const std::array<PropertyRow<OstrelAgent>, 9> properties;
 };
 
-/** The adapter of VELKO_OstrelAgent, which is only read. */
+/** Adapter of VELKO_OstrelAgent, which is read-only. */
 using CMPIOstrelAgent = ProductAdapter<AgentAdapterTraits>;
 
 extern template class ElementAdapter<AgentAdapterTraits>;

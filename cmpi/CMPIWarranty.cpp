@@ -11,7 +11,7 @@ const TraceSource WarrantyAdapterTraits::traceSource{loggerCMPIWarranty, "CMPIWa
 
 using W = Warranty;
 
-/** In the order in which an instance is filled. */
+/** In the order in which instances are filled. */
 const std::array<PropertyRow<W>, 9> WarrantyAdapterTraits::properties{{
     readOnly<W, &W::getCaption>("Caption"),
     readOnly<W, &W::getDescription>("Description"),

@@ -8,7 +8,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-/** The CIM class VELKO_Warranty: what the design shared with VELKO_Lease needs to know of it. */
+/** Traits of VELKO_Warranty for RecordAdapter. */
 struct WarrantyAdapterTraits {
     using Element = Warranty;
     static constexpr const char* className = "VELKO_Warranty";
@@ -21,7 +21,7 @@ struct WarrantyAdapterTraits {
     static const std::array<PropertyRow<Warranty>, 9> properties;
 };
 
-/** The adapter of VELKO_Warranty. */
+/** Adapter of VELKO_Warranty. */
 using CMPIWarranty = RecordAdapter<WarrantyAdapterTraits>;
 
 extern template class ElementAdapter<WarrantyAdapterTraits>;

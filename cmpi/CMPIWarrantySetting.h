@@ -7,7 +7,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-/** The CIM class VELKO_WarrantySetting: what the shared design of the setting associations needs to know of it. */
+/** Traits of VELKO_WarrantySetting for SettingAdapter. */
 struct WarrantySettingAdapterTraits {
     using Element = CMPIWarranty;
     using Setting = WarrantySetting;
@@ -27,12 +27,15 @@ struct WarrantySettingAdapterTraits {
 
 extern template class SettingAdapter<WarrantySettingAdapterTraits>;
 
-/** The adapter of VELKO_WarrantySetting. */
+/** Adapter of VELKO_WarrantySetting. */
 class CMPIWarrantySetting : public SettingAdapter<WarrantySettingAdapterTraits> {
 public:
     using SettingAdapter::SettingAdapter;
 
-    /** Path that a computer's warranty would have; without keys if the computer's path has none. */
+    /**
+     * Returns the path of a computer's warranty, whether or not it exists; without keys if the computer's path has
+     * none.
+     */
     CMPIObjectPath* locateWarranty(const CMPIObjectPath* computerPath) { return locateElement(computerPath); }
 };
 

@@ -7,23 +7,22 @@
 namespace KO::LeaseWarrantyProvider {
 
 /**
- * What the adapters over one managed element have in common: they hold the element, and stand where it
- * stands. Base of RecordAdapter and ProductAdapter.
+ * Base of RecordAdapter and ProductAdapter: owns the managed element and has the element's position.
  *
- * Traits gives Element, traceSource, and the constructor's and destructor's names in the log.
+ * Traits defines Element, traceSource, and the names of the constructor and the destructor in the log.
  */
 template <class Traits>
 class ElementAdapter {
 public:
-    /** Stands on the first of all that the element has. */
+    /** Starts at the first object of the element. */
     ElementAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext, std::string requestNameSpace);
 
-    /** Destroys the element, which may throw where its destructor does. */
+    /** Destroys the element, whose destructor may throw. */
     ~ElementAdapter() noexcept(false);
     ElementAdapter(const ElementAdapter&) = delete;
     ElementAdapter& operator=(const ElementAdapter&) = delete;
 
-    /** Whether the adapter stands on an instance. */
+    /** Returns whether there is a current instance. */
     operator bool();
 
     /** Moves to the next instance that the path selects. */
@@ -32,7 +31,7 @@ public:
 protected:
     using Element = typename Traits::Element;
 
-    /** Stands on the first of what the path's keys select: narrow makes filters of the element of them. */
+    /** Starts at the first object that the path's keys select. `narrow` sets the element's filters from the keys. */
     ElementAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext, const CMPIObjectPath* path,
                    void (*narrow)(Element& element, const CMPIObjectPath* path));
 

@@ -1,7 +1,6 @@
 #pragma once
 
-// Definitions of ElementAdapter. Included by the definitions of the adapters that build on it, and
-// nowhere else.
+// Definitions of ElementAdapter. Include only in RecordAdapterImpl.h and ProductAdapterImpl.h.
 
 #include "ElementAdapter.h"
 #include "KO/ProviderUtilities.h"

@@ -9,14 +9,14 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-/** One key of a class: its name, and how its value is read into a text. Without a value the text stays as it was. */
+/** A key of a class: its name and its getter. The getter leaves the string unchanged if there is no value. */
 template <class Element>
 struct KeyRow {
     const char* name;
     void (*read)(const Element& element, std::string& text);
 };
 
-/** The row of a key whose value a getter gives. */
+/** Returns the row of a key that a getter reads. */
 template <class Element, auto getter>
 constexpr KeyRow<Element> key(const char* name) {
     return {name, [](const Element& element, std::string& text) {
@@ -24,7 +24,7 @@ constexpr KeyRow<Element> key(const char* name) {
             }};
 }
 
-/** A key that narrows a request, and the filter of the element that it becomes. */
+/** A key that selects instances, and the element's filter for it. */
 template <class Element>
 struct KeyFilter {
     const char* name;
@@ -32,41 +32,43 @@ struct KeyFilter {
 };
 
 /**
- * The adapter of a CIM class that describes an installed product, identified by keys such as name,
- * vendor and version: the design that CMPIOstrelAgent and CMPIAssetIDDetail share. It stands where
- * its element stands.
+ * Adapter of a CIM class that describes an installed product, with keys such as name, vendor and version. Base of
+ * CMPIOstrelAgent and CMPIAssetIDDetail.
  *
- * Traits gives:
+ * Traits defines:
  *   Element              the managed element
  *   className            the CIM class
  *   constructor, destructor   their names in the log
  *   traceSource          trace source
- *   keys                 table of KeyRow, in the order in which a path carries them
- *   filters              table of KeyFilter, in the order in which a path's keys are looked at
- *   properties           table of PropertyRow, in the order in which an instance is filled
- *   modify(element, instance)   of a class that can be modified
+ *   keys                 table of KeyRow, in the order of a path's keys
+ *   filters              table of KeyFilter, in the order in which a path's keys are compared
+ *   properties           table of PropertyRow, in the order in which instances are filled
+ *   modify(element, instance)   only for a class that can be modified
  */
 template <class Traits>
 class ProductAdapter : public ElementAdapter<Traits> {
 public:
     using ElementAdapter<Traits>::ElementAdapter;
 
-    /** What the path's keys select, or all if it has none. May throw what the element's filters throw. */
+    /**
+     * Selects the instances that match the path's keys, or all if it has none. Throws the exceptions of the element's
+     * setFilter.
+     */
     ProductAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext, const CMPIObjectPath* path);
 
-    /** Makes filters of the path's keys. May throw what the element's filters throw. */
+    /** Sets the element's filters from the path's keys. Throws the exceptions of the element's setFilter. */
     void setObjectPath(const CMPIObjectPath* path);
 
     /**
-     * Path of the current instance; null when it cannot be made. A key without a value has that of the key
-     * before it.
+     * Returns the path of the current instance; null if the broker cannot create it. A key without a value repeats the
+     * value of the preceding key.
      */
     CMPIObjectPath* getObjectPath();
 
-    /** The current instance; null when it cannot be made. */
+    /** Returns the current instance; null if the broker cannot create it. */
     CMPIInstance* getCMPIInstance(const char** properties);
 
-    /** Writes the instance's modifiable properties; a null instance changes nothing. */
+    /** Writes the instance's modifiable properties. A null instance changes nothing. */
     template <class ModifiablePolicy = Traits>
     void modifyCMPIInstance(const CMPIInstance* referenceInstance, const char** properties);
 

@@ -1,7 +1,7 @@
 #pragma once
 
-// Definitions of ProductAdapter. Included by the source file of each adapter and nowhere else, so that
-// each adapter's code and trace buffers stand in its own unit.
+// Definitions of ProductAdapter. Included only by the source file of each adapter, so that its code and trace buffers
+// belong to that translation unit.
 
 #include "ElementAdapterImpl.h"
 #include "KO/ProviderUtilities.h"
@@ -71,7 +71,7 @@ CMPIInstance* ProductAdapter<Traits>::getCMPIInstance(const char** properties) {
 template <class Traits>
 template <class ModifiablePolicy>
 void ProductAdapter<Traits>::modifyCMPIInstance(const CMPIInstance* referenceInstance, const char** properties) {
-    // Named here, since the compiler's name of a function template carries its argument.
+    // Explicit, since __builtin_FUNCTION of a function template includes the template argument.
     const Traced traced(at(Traits::traceSource, Level::flow, "modifyCMPIInstance"), label::referenceInstance,
                         referenceInstance, label::propertiesBare, properties);
     if (referenceInstance != nullptr) {

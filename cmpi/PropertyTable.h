@@ -7,7 +7,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-/** An instance being filled from an element. The text serves one string property after the other. */
+/** An instance that is being filled from an element. All string properties share the string. */
 struct InstanceBuilder {
     const CMPIBroker* broker;
     CMPIInstance* instance;
@@ -15,28 +15,28 @@ struct InstanceBuilder {
 };
 
 /**
- * One property of a CIM class. The rows of a class stand in the order in which its instances are
- * filled; they drive builder and, where it keeps that order, modification.
+ * A property of a CIM class. Instances are filled in the order of a class's rows; modifications use the same order
+ * where modify is set.
  */
 template <class Element>
 struct PropertyRow {
     const char* name;
 
-    /** Sets the property from the element. */
+    /** Sets the instance's property from the element. */
     void (*fill)(const Element& element, InstanceBuilder& builder, const char* name);
 
-    /** Changes the element from the instance, if the instance has the property. Null: not by this row. */
+    /** Changes the element from the instance if the instance has the property. Null if this row cannot modify. */
     void (*modify)(Element& element, const CMPIInstance* instance, const char* name);
 };
 
-/** How a property's value is set: by the type of the getter's value, or from text that says which it is. */
+/** Type under which a property is set: the type of the getter's value, or string or datetime. */
 enum class ValueForm {
     typed,     ///< string, number or flag
-    text,      ///< string, set as text that is no datetime
-    dateTime,  ///< datetime, given and taken as CIM datetime text
+    text,      ///< string that is not a datetime
+    dateTime,  ///< datetime, read and written as a CIM datetime string
 };
 
-/** Whether a property is set when the getter answers that there is no value: with what the text held before. */
+/** When to set a property. `always` sets it even if the getter returns false, to the string's previous value. */
 enum class Presence {
     ifAvailable,
     always,
@@ -44,7 +44,7 @@ enum class Presence {
 
 namespace PropertyTableDetail {
 
-/** What a getter tells: the class that declares it and the type of its value. */
+/** Class and value type of a getter. */
 template <class Getter>
 struct GetterTraits;
 
@@ -114,13 +114,13 @@ void modify(Element& element, const CMPIInstance* instance, const char* name) {
 
 }  // namespace PropertyTableDetail
 
-/** The row of a property that is only filled: a read-only one, or one whose changes the class takes in another way. */
+/** Returns the row of a property that is only filled: it is read-only, or the class modifies it separately. */
 template <class Element, auto getter, ValueForm form = ValueForm::typed, Presence presence = Presence::ifAvailable>
 constexpr PropertyRow<Element> readOnly(const char* name) {
     return {name, &PropertyTableDetail::fill<Element, getter, form, presence>, nullptr};
 }
 
-/** The row of a property that a client may change. */
+/** Returns the row of a property that clients can modify. */
 template <class Element, auto getter, auto setter, ValueForm form = ValueForm::typed>
 constexpr PropertyRow<Element> modifiable(const char* name) {
     return {name, &PropertyTableDetail::fill<Element, getter, form, Presence::ifAvailable>,

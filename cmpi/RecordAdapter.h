@@ -7,53 +7,59 @@
 namespace KO::LeaseWarrantyProvider {
 
 /**
- * The adapter of a CIM class whose instances are records with the one key "InstanceID": the design
- * that CMPILease and CMPIWarranty share. It stands where its element stands.
+ * Adapter of a CIM class whose instances are records with the single key "InstanceID". Base of CMPILease and
+ * CMPIWarranty.
  *
- * Traits gives:
+ * Traits defines:
  *   Element                      the managed element
  *   className                    the CIM class
  *   constructor, destructor      their names in the log
- *   tracesCreation               whether a creation's result is traced
+ *   tracesCreation               whether a successful creation is traced
  *   modifyPropertiesLabel        label of the property list in the trace of a modification
  *   traceSource, properties      trace source and table of PropertyRow of the class
  */
 template <class Traits>
 class RecordAdapter : public ElementAdapter<Traits> {
 public:
-    /** For creation, and as the end of an association: all records. */
+    /** Selects all records. For CreateInstance and for the ends of associations. */
     using ElementAdapter<Traits>::ElementAdapter;
 
     /**
-     * For every other request: the record that the path's key names, or all if it has no key that can be
-     * read. When the adapter ends and anything was changed, the data file is written back; that may throw.
+     * Selects the record with the path's key, or all records if the path has no readable key. The destructor writes the
+     * data file if anything changed, and may throw.
      */
     RecordAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext, const CMPIObjectPath* path);
 
-    /** Narrows the element to the record that the path's key names. A key that cannot be read narrows nothing. */
+    /** Selects the record with the path's key. A key that cannot be read is ignored. */
     void setObjectPath(const CMPIObjectPath* path);
 
-    /** Path of the current record; without key when the adapter stands on none, null when it cannot be made. */
+    /** Returns the path of the current record; without key if there is none, null if the broker cannot create it. */
     CMPIObjectPath* getObjectPath();
 
-    /** Instance of the current record with every property that is present; null when it cannot be made. */
+    /**
+     * Returns the instance of the current record with every property that has a value; null if the broker cannot create
+     * it.
+     */
     CMPIInstance* getCMPIInstance(const char** properties);
 
     /**
-     * Makes a record with the path's key and default values, and stands on it. Throws what the element's
-     * creation throws, as when the key is taken.
-     * @return its instance; null when the path has no key that is text, and nothing was made, or when the
-     *     instance of the new record cannot be made
+     * Creates a record with the path's key and default values, and makes it current. Throws the exceptions of the
+     * element's create(), for example if the key exists.
+     * @return the new instance; null if the path has no string key, in which case no record is created, or if the
+     *         broker cannot create the instance
      */
     CMPIInstance* createCMPIInstance(const CMPIObjectPath* desiredObjectPath);
 
     /**
-     * Writes the instance's modifiable properties into the current record; a null instance changes nothing.
-     * Throws what the element's setters throw, as when no record is current.
+     * Writes the instance's modifiable properties to the current record. A null instance changes nothing. Throws the
+     * exceptions of the element's setters, for example if there is no current record.
      */
     void modifyCMPIInstance(const CMPIInstance* referenceInstance, const char** properties);
 
-    /** Removes the current record. Throws what the element's removal throws, as when no key named a record. */
+    /**
+     * Removes the current record. Throws the exceptions of the element's remove(), for example if no key selected a
+     * record.
+     */
     void deleteCMPIInstance();
 
 private:

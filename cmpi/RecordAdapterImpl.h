@@ -1,7 +1,7 @@
 #pragma once
 
-// Definitions of RecordAdapter. Included by the source file of each adapter and nowhere else, so that
-// each adapter's code and trace buffers stand in its own unit.
+// Definitions of RecordAdapter. Included only by the source file of each adapter, so that its code and trace buffers
+// belong to that translation unit.
 
 #include "ElementAdapterImpl.h"
 #include "KO/Instrumentation.h"
@@ -22,7 +22,7 @@ namespace {
 
 constexpr const char* instanceIdKey = "InstanceID";
 
-/** The characters of a path's string key; nothing when the broker gives anything else. */
+/** Returns the characters of a path's string key; none if the key has another type or cannot be read. */
 std::optional<std::string> stringKey(const CMPIObjectPath* path, const char* name) {
     CMPIStatus status{CMPI_RC_OK, nullptr};
     const CMPIData key = path->ft->getKey(path, name, &status);
@@ -88,7 +88,7 @@ CMPIInstance* RecordAdapter<Traits>::createCMPIInstance(const CMPIObjectPath* de
     const bool found = ProviderUtilities::getKeyProperty(desiredObjectPath, instanceIdKey, instanceId);
     traceVariable(at(Traits::traceSource), "instanceId", instanceId);
 
-    // Asked for at each creation, although nothing in the record depends on it.
+    // The path is requested for each creation, although the record does not depend on it.
     Instrumentation instrumentation;
     instrumentation.convertPathToString(instrumentation.getPathToComputer());
 

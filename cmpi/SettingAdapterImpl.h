@@ -1,7 +1,7 @@
 #pragma once
 
-// Definitions of SettingAdapter. Included by the source file of each adapter and nowhere else, so that
-// each adapter's code and trace buffers stand in its own unit.
+// Definitions of SettingAdapter. Included only by the source file of each adapter, so that its code and trace buffers
+// belong to that translation unit.
 
 #include "KO/ClassIds.h"
 #include "KO/Moniker.h"
@@ -161,7 +161,7 @@ CMPIInstance* SettingAdapter<Traits>::getAssociator(const char** properties) {
     }
 }
 
-/** A path of the class with the keys that the source path's keys translate to. */
+/** Returns a path of the class whose keys are the translated keys of the source path. */
 template <class Traits>
 template <class Translate>
 CMPIObjectPath* SettingAdapter<Traits>::locate(const char* className, const CMPIObjectPath* source,
