@@ -36,10 +36,10 @@ constexpr unsigned int assetStringArea = 1024;
 constexpr unsigned long withoutLimit = 0xFFFFFFFF;
 constexpr unsigned int presentTime = 3;
 
-/** Stands for an empty label or text, so that all five pairs carry text. */
+/** Value of an empty label or data string, so that all five pairs have values. */
 constexpr const char* emptyPersonalized = "Null";
 
-/** Holds the file lock while it lives. */
+/** Scoped lock of the asset data file. */
 class FileLock {
 public:
     FileLock() { _fileMutex.lock(withoutLimit); }
@@ -55,7 +55,7 @@ struct AssetIDDetails::StoredFields {
     struct Field {
         const char* key;
         std::variant<std::string AssetIDDetails::*, DateTime AssetIDDetails::*> member;
-        const char* name;  ///< under which a text is traced
+        const char* name;  ///< name of a string field in the trace
     };
 
     static constexpr std::array<Field, 11> all{{
@@ -73,7 +73,7 @@ struct AssetIDDetails::StoredFields {
     }};
 };
 
-/** Calls what treats texts or what treats dates on each fixed field, in order. */
+/** Calls onText for each string field and onDate for each date field, in order. */
 template <class OnText, class OnDate>
 void AssetIDDetails::forEachField(OnText onText, OnDate onDate) {
     for (const auto& field : StoredFields::all) {
@@ -222,7 +222,7 @@ bool AssetIDDetails::comparedValue(FilterType type, std::string& value) const {
     }
 }
 
-/** A stored text, under the name of the calling getter. */
+/** Reads a stored string. Traced under the name of the calling getter. */
 bool AssetIDDetails::stored(const CallSite& site, const std::string& member, std::string& value) const {
     const Traced traced(site);
     if (_Loaded) {
@@ -231,7 +231,7 @@ bool AssetIDDetails::stored(const CallSite& site, const std::string& member, std
     return _Loaded;
 }
 
-/** A stored date as its text, under the name of the calling getter. */
+/** Reads a stored date as a CIM datetime string. Traced under the name of the calling getter. */
 bool AssetIDDetails::stored(const CallSite& site, const DateTime& member, std::string& value) const {
     const Traced traced(site);
     if (_Loaded) {
@@ -333,7 +333,7 @@ bool AssetIDDetails::getProductName(std::string& value) const {
     }
     const std::size_t dash = name.find('-');
     if (dash != std::string::npos) {
-        // The blank before the dash goes with it. A dash at the very beginning cuts nothing.
+        // Also drops the character before the dash, normally a blank. A leading dash truncates nothing.
         value = dash == 0 ? name : name.substr(0, dash - 1);
     }
     return true;

@@ -13,7 +13,7 @@ namespace KO {
 class PropertyFile;
 struct CallSite;
 
-/** Held around every access to the asset data file: its creation, a whole read, a whole write. */
+/** Locked while the asset data file is created, read or written. */
 extern Mutex _fileMutex;
 
 }  // namespace KO
@@ -21,23 +21,23 @@ extern Mutex _fileMutex;
 namespace KO::LeaseWarrantyProvider {
 
 /**
- * The managed element of VELKO_AssetIDDetails: the asset identification of this computer, kept in the
- * agent's property file asset.dat, and the computer and product that it belongs to.
+ * The managed element of VELKO_AssetIDDetails: the asset identification of this computer in the agent's property file
+ * asset.dat, with properties of the computer and the product.
  *
- * It is a cursor over the computer nodes of the instrumentation tree, narrowed by filters; the asset
- * data are the same for each. They are read whole when the element is made and are a snapshot from
- * then on; setters change the snapshot, and flushAssetData writes it back whole.
+ * The element is a cursor over the computer nodes of the instrumentation tree, restricted by filters. The asset data
+ * are the same for each node. The constructor reads the file into a snapshot, the setters change the snapshot, and
+ * flushAssetData writes it to the file.
  *
- * Nothing here throws on account of the file or its lock: a failure is logged and swallowed. When the
- * file could not be read, the getters of stored values answer false. What the framework throws otherwise,
- * as when the cursors are made, a node is read or a date converted, is let through.
+ * Failures of the file or its lock are logged and never thrown. If the file could not be read, the getters of stored
+ * values return false. Other exceptions of the framework are propagated, for example from creating the cursors, reading
+ * a node or converting a date.
  */
 class AssetIDDetails {
 public:
-    /** A label and the text that belongs to it. */
+    /** A label and its data string. */
     using PersonalizedPair = std::pair<std::string, std::string>;
 
-    /** What a filter compares. A value without a name compares like FILTER_IDENTIFYING_NUMBER. */
+    /** Property that a filter compares. Unnamed values compare like FILTER_IDENTIFYING_NUMBER. */
     enum FilterType : int {
         FILTER_IDENTIFYING_NUMBER = 0,
         FILTER_NAME = 1,
@@ -51,39 +51,39 @@ public:
         std::string value;
     };
 
-    /** How many personalized pairs are kept. */
+    /** Number of personalized pairs. */
     static constexpr std::size_t pairCount = 5;
 
     /**
-     * Reads the file, which is created, empty, if there is none, and stands on the first computer node.
-     * Without a computer or a system node nothing is read.
+     * Reads the file and moves to the first computer node. Creates an empty file if there is none. Does not read the
+     * file if there is no computer node or no system node.
      */
     AssetIDDetails();
-    /** The file is not written. */
+    /** Does not write the file. */
     ~AssetIDDetails();
     AssetIDDetails(const AssetIDDetails&) = delete;
     AssetIDDetails& operator=(const AssetIDDetails&) = delete;
 
-    /** Whether the element stands on a computer node. */
+    /** Returns whether there is a current computer node. */
     operator bool() const;
 
     /** Moves to the next computer node that passes the filters. */
     void operator++();
 
-    /** Adds a filter and moves, from the current node on, to the first that passes all. */
+    /** Adds a filter. Moves to the first node that passes all filters, starting at the current one. */
     void setFilter(FilterType type, std::string value);
 
-    /** Whether the current node passes all filters. A filter whose value cannot be found out counts as passed. */
+    /** Returns whether the current node passes all filters. A filter whose property cannot be read passes. */
     bool evaluate() const;
 
     /** Writes the snapshot to the file. A failure is only logged. */
     void flushAssetData();
 
-    /** Path of the file, which is created, empty, if there is none; a failure is only logged. */
+    /** Returns the path of the file and creates an empty file if there is none. A failure is only logged. */
     std::wstring getFileName();
 
     /** @name Stored values
-     * Answer whether the file was read. Dates are CIM datetime text.
+     * Each returns whether the file was read. Dates are CIM datetime strings.
      */
     ///@{
     bool getAssetNumber(std::string& value) const;
@@ -94,39 +94,39 @@ public:
     bool getPrimaryOwnerDepartment(std::string& value) const;
     bool getSystemLocation(std::string& value) const;
     bool getZOPMProfile(std::string& value) const;
-    bool getDeploymentProfile(std::string& value) const;  ///< the ZOPM profile under its general name
+    bool getDeploymentProfile(std::string& value) const;  ///< same value as getZOPMProfile()
     bool getLastInventoried(std::string& value) const;
     bool getPurchaseDate(std::string& value) const;
     bool getZOPMUpdateTime(std::string& value) const;
-    bool getDeploymentUpdateTime(std::string& value) const;  ///< the ZOPM update time under its general name
+    bool getDeploymentUpdateTime(std::string& value) const;  ///< same value as getZOPMUpdateTime()
     bool getPersonalizedData(std::vector<PersonalizedPair>& value) const;
     ///@}
 
     /** @name Values of the computer
-     * Answer whether the instrumentation has them; where it does not, the argument stays as it was.
+     * Each returns whether the instrumentation has the value, and otherwise leaves the argument unchanged.
      */
     ///@{
-    bool getCSName(std::string& value) const;  ///< the computer's name
-    bool getName(std::string& value) const;    ///< the same
+    bool getCSName(std::string& value) const;  ///< name of the computer
+    bool getName(std::string& value) const;    ///< name of the computer
     bool getVendor(std::string& value) const;
 
     /**
-     * The product's name without its suffix: of "name - suffix", what stands before the blank and the
-     * first dash, whatever the character in the blank's place is. A name that begins with the dash is
-     * given whole. A name without a dash leaves the argument as it was; the answer is true all the same.
+     * Reads the product's name without its suffix: the part of "name - suffix" before the first dash and the character
+     * preceding it. Returns a name that starts with the dash unchanged. If the name has no dash, leaves the argument
+     * unchanged and returns true.
      */
     bool getProductName(std::string& value) const;
     ///@}
 
-    std::string getIdentifyingNumber() const;  ///< text form of the system's place in the instrumentation tree
-    std::string getVersion() const;            ///< the agent product's version
+    std::string getIdentifyingNumber() const;  ///< string form of the system node's path
+    std::string getVersion() const;            ///< version of the agent product
     std::string getCaption() const;
     std::string getDescription() const;
-    unsigned int getAssetIDStringArea() const;  ///< room for asset texts, in bytes: always 1024
-    std::string getLocalDateTime() const;       ///< the present time, as CIM datetime text
+    unsigned int getAssetIDStringArea() const;  ///< size of the asset string area in bytes; always 1024
+    std::string getLocalDateTime() const;       ///< current time as a CIM datetime string
 
     /** @name Changes of the snapshot
-     * Dates are CIM datetime text. There is none for the asset tag, which is kept as it was read.
+     * Dates are CIM datetime strings. The asset tag has no setter.
      */
     ///@{
     void setAssetNumber(const std::string& value);
@@ -157,7 +157,7 @@ private:
 
     bool _Loaded = false;
     std::wstring _FileName{};
-    mutable Instrumentation _ComputerNode{};  ///< mutable: the framework's cursor has no operation for constant ones
+    mutable Instrumentation _ComputerNode{};  ///< mutable: the framework's cursor has no const operations
     mutable Instrumentation _SystemNode{};
     std::string _AssetNumber{};
     std::string _AssetIdTag{};

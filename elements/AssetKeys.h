@@ -2,7 +2,7 @@
 
 #include <array>
 
-/** The keys of the asset data file: the only ones that are read or written. */
+/** The keys of the asset data file that are read and written. */
 namespace KO::LeaseWarrantyProvider {
 
 constexpr const char* USER_ASSET_NUMBER_KEY = "USER.AssetNumber";
@@ -27,7 +27,7 @@ constexpr const char* USER_PERSONALIZED_DATA3_KEY = "USER.PersonalizedData3";
 constexpr const char* USER_PERSONALIZED_DATA4_KEY = "USER.PersonalizedData4";
 constexpr const char* USER_PERSONALIZED_DATA5_KEY = "USER.PersonalizedData5";
 
-/** The keys of one personalized pair. */
+/** The keys of a personalized pair. */
 struct PairKeys {
     const char* label;
     const char* data;

@@ -7,7 +7,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-/** What the design shared with the warranty element needs to know of leases. */
+/** Traits of leases for RecordElement. */
 struct LeaseElementTraits {
     using Base = LeaseBase;
 
@@ -16,10 +16,10 @@ struct LeaseElementTraits {
 };
 
 /**
- * The managed element of VELKO_Lease: the leases of this computer, one after the other.
+ * The managed element of VELKO_Lease: a cursor over the leases of this computer.
  *
- * The getters of the current lease answer true. They and the setters throw InstrumentationException
- * when no lease is current.
+ * The getters of the current lease return true. Getters and setters throw InstrumentationException if there is no
+ * current lease.
  */
 class Lease : public RecordElement<LeaseElementTraits> {
 public:
@@ -27,8 +27,8 @@ public:
     void removeLease() { remove(); }
 
     bool getLessor(std::string& value) const;
-    bool getBaseTermCommencementDate(std::string& value) const;  ///< CIM datetime text
-    bool getBaseRent(std::string& value) const;                  ///< money as the client wrote it, like the next three
+    bool getBaseTermCommencementDate(std::string& value) const;  ///< CIM datetime string
+    bool getBaseRent(std::string& value) const;                  ///< amount of money, unparsed, like the next three
     bool getFairMarketRental(std::string& value) const;
     bool getFairMarketValue(std::string& value) const;
     bool getTerminationValue(std::string& value) const;

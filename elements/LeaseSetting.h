@@ -5,19 +5,19 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-/** What the design that the setting elements share needs to know of leases. */
+/** Traits of leases for SettingElement. */
 struct LeaseSettingElementTraits {
     using Element = Lease;
     static constexpr const char* constructor = "LeaseSetting";
     static constexpr const char* destructor = "~LeaseSetting";
     static constexpr const char* toElement = "getLeaseMoniker";
-    static constexpr bool toElementExits = false;  // unlike every other operation
+    static constexpr bool toElementExits = false;  // the exit is not traced, unlike that of every other operation
     static constexpr const char* elementLabel = " monikerLease=";
 
     static const TraceSource traceSource;
 };
 
-/** The managed element of VELKO_LeaseSetting: which lease a computer has, and which computer has a lease. */
+/** The managed element of VELKO_LeaseSetting: translates between monikers of computers and leases. */
 class LeaseSetting : public SettingElement<LeaseSettingElementTraits> {
 public:
     Moniker getLeaseMoniker(Moniker& computerMoniker) { return getElementMoniker(computerMoniker); }

@@ -21,7 +21,7 @@ const TraceSource traceSource{loggerOstrelAgent, "OstrelAgent.cpp"};
 
 constexpr const char* agentCaption = "VEL Ostrel";
 
-/** Only whether it is there counts, not what is in it. */
+/** Only its existence matters, not its content. */
 constexpr const wchar_t* markerFileName = L"version.lv1";
 constexpr const wchar_t* markedSuffix = L" Tarvik Agent";
 
@@ -33,7 +33,7 @@ std::string displayName() {
     return make_string(name);
 }
 
-/** What a filter type is compared with. */
+/** The value that a filter type is compared with. */
 struct ComparedValue {
     OstrelAgent::FilterType type;
     std::string (OstrelAgent::*get)() const;

@@ -5,12 +5,12 @@
 namespace KO::LeaseWarrantyProvider {
 
 /**
- * The managed element of VELKO_OstrelAgent: the management agent itself, of which there is always
- * exactly one. A one-step cursor; a filter only checks that a key describes this agent.
+ * The managed element of VELKO_OstrelAgent: the management agent itself. A cursor over exactly one object; filters only
+ * check that a key identifies this agent.
  */
 class OstrelAgent {
 public:
-    /** The keys that setFilter checks. Other values are accepted and ignored. */
+    /** Keys that setFilter checks. Unnamed values are accepted and ignored. */
     enum FilterType : int {
         FILTER_NAME = 0,
         FILTER_IDENTIFYING_NUMBER = 1,
@@ -19,21 +19,24 @@ public:
         FILTER_VERSION = 4,
     };
 
-    /** Stands on the agent. */
+    /** Starts at the agent. */
     OstrelAgent();
 
-    /** Whether the element still stands on the agent. */
+    /** Returns whether the cursor is at the agent. */
     operator bool() const;
 
-    /** Moves past the agent, for good. */
+    /** Moves past the agent. */
     void operator++();
 
-    /** Changes nothing, but throws InstrumentationException when the value, byte for byte, is not this agent's. */
+    /**
+     * Throws InstrumentationException if the value differs from that of the agent, byte for byte. Otherwise does
+     * nothing.
+     */
     void setFilter(FilterType type, std::string value) const;
 
-    /** Display name: the product's name, with a suffix where the installation carries the marker file. */
+    /** Returns the display name: the product's name, with a suffix if the marker file is installed. */
     std::string getName() const;
-    std::string getProductName() const;  ///< the same text
+    std::string getProductName() const;  ///< the same string as getName()
     std::string getVersion() const;
     std::string getBuildNumber() const;
     std::string getIdentifyingNumber() const;

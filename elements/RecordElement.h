@@ -24,25 +24,24 @@ struct RecordElementNames {
     FixedString createName;
     FixedString removeName;
     FixedString elementName;        ///< value of the ElementName property
-    FixedString removeUnfiltered;   ///< thrown if a record is to be removed and no filter is set
+    FixedString removeUnfiltered;   ///< thrown if a record is removed without a filter
     FixedString identifierMissing;  ///< thrown if the current record has no identifier
 };
 
 /**
- * An element over a record store: it walks the records in table order, narrowed by filters, and
- * gives access to the current one. The design that Lease and Warranty share.
+ * A cursor over the records of a store in table order, restricted by filters. Base of Lease and Warranty.
  *
- * One is made for a request. It then stands on the first record; only setFilter and operator++ look at
- * the filters. What it changes is seen by all at once, and the record file is rewritten when it ends.
+ * An element belongs to one request. It starts at the first record; only setFilter and operator++ apply the filters.
+ * Changes are visible to all elements at once; the destructor rewrites the record file.
  *
- * Traits gives:
+ * Traits defines:
  *   Base               the record cursor
  *   traceSource, names trace source and RecordElementNames of the element
  */
 template <class Traits>
 class RecordElement {
 public:
-    /** What a filter compares. Values without a name are kept and match every record. */
+    /** Property that a filter compares. Filters of unnamed values are stored and match every record. */
     enum FilterType : int {
         InstanceIDFilter = 0,  ///< the identifier, byte for byte
     };
@@ -50,10 +49,10 @@ public:
     /** A condition on records. */
     struct Filter {
         FilterType type;
-        std::string reference;  ///< the value that the record must have
+        std::string reference;  ///< the required value
     };
 
-    /** Stands on the first record. May throw InstrumentationException, as the store does. */
+    /** Starts at the first record. Throws InstrumentationException if the store does. */
     RecordElement();
 
     /** Rewrites the file if this element changed anything; that may throw. */
@@ -61,29 +60,29 @@ public:
     RecordElement(const RecordElement&) = delete;
     RecordElement& operator=(const RecordElement&) = delete;
 
-    /** Whether the element stands on a record. */
+    /** Returns whether there is a current record. */
     operator bool();
 
     /** Moves to the next record that passes the filters, or to the end. */
     void operator++();
 
-    /** Adds a filter and moves forward, from the current record on, to the first that passes all. */
+    /** Adds a filter. Moves to the first record that passes all filters, starting at the current one. */
     void setFilter(FilterType type, std::string reference);
 
     /**
-     * Whether the current record passes all filters. Throws InstrumentationException when an identifier
-     * is to be compared and no record is current.
+     * Returns whether the current record passes all filters. Throws InstrumentationException if an identifier is
+     * compared and there is no current record.
      */
     bool evaluate() const;
 
-    /** Makes a record. @return true. Throws InstrumentationException when the identifier is taken. */
+    /** Creates a record and returns true. Throws InstrumentationException if the identifier exists. */
     bool create(std::string instanceId);
 
-    /** Removes the current record. Throws InstrumentationException when no filter was set, or at the end. */
+    /** Removes the current record. Throws InstrumentationException if no filter was set or the cursor is at the end. */
     void remove();
 
-    /** @name Properties that every record has alike
-     * A getter that answers false leaves its argument untouched: the property is to stay unset.
+    /** @name Properties with the same value for every record
+     * A getter that returns false leaves its argument unchanged; the property stays unset.
      */
     ///@{
     bool getElementName(std::string& value) const;
@@ -93,13 +92,13 @@ public:
     bool getChangeableType(unsigned short& value) const;
     ///@}
 
-    /** The current record's identifier. Throws InstrumentationException when no record is current. */
+    /** Reads the current record's identifier. Throws InstrumentationException if there is no current record. */
     bool getInstanceID(std::string& value) const;
 
 protected:
     using Property = typename Traits::Base::Property;
 
-    /** Reads or writes a property of the current record under the name of the calling operation. */
+    /** Reads or writes a property of the current record. Traced under the name of the calling operation. */
     template <class Value>
     bool get(const CallSite& site, Property property, Value& value) const;
     template <class Value>

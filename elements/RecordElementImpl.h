@@ -1,7 +1,7 @@
 #pragma once
 
-// Definitions of RecordElement. Included by the source file of each element and nowhere else, so that
-// each element's code and trace buffers stand in its own unit.
+// Definitions of RecordElement. Included only by the source file of each element, so that its code and trace buffers
+// belong to that translation unit.
 
 #include "KO/Exceptions.h"
 #include "RecordElement.h"
@@ -70,7 +70,7 @@ bool RecordElement<Traits>::getElementName(std::string& value) const {
 
 namespace {
 
-/** The body of the getters of what no record has. */
+/** Common implementation of the getters of properties that no record has. */
 bool notAvailable(const CallSite& site) {
     const Traced traced(site);
     return false;

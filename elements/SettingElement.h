@@ -7,21 +7,20 @@
 namespace KO::LeaseWarrantyProvider {
 
 /**
- * The managed element of a setting association: tells which lease or warranty belongs to a computer,
- * and back. A record belongs to the computer whose node path, in text form, is the record's identifier.
- * The design that LeaseSetting and WarrantySetting share.
+ * The managed element of a setting association: translates the moniker of a computer to that of its lease or warranty,
+ * and back. A record belongs to a computer if its identifier is the string form of the computer's node path. Base of
+ * LeaseSetting and WarrantySetting.
  *
- * The moniker of a computer has the key "Name", that of a record the key "InstanceID", each spelled so;
- * other keys are ignored, and of the argument only the selection changes. The operations throw
- * FrameworkException for a moniker without its key and InstrumentationException for a node that has no
- * name, or is not there where a record tells its place. Of what arises below them they let these two
- * classes out; any other exception ends the process.
+ * A computer's moniker has the key "Name", a record's the key "InstanceID"; both are case-sensitive and other keys are
+ * ignored. The operations change only the selection of their argument. They throw FrameworkException if the key is
+ * missing, and InstrumentationException if the node has no name or a record's identifier is not the path of a node.
+ * They propagate these two classes only; any other exception terminates the process.
  *
- * Traits gives:
+ * Traits defines:
  *   Element                          the element of the records
  *   traceSource                      trace source
  *   constructor, destructor          their names in the log
- *   toElement, toElementExits        name in the log of the way to the record, and whether its exit is traced
+ *   toElement, toElementExits        name of getElementMoniker() in the log, and whether its exit is traced
  *   elementLabel                     label of the record's moniker
  */
 template <class Traits>
@@ -32,13 +31,13 @@ public:
     SettingElement(const SettingElement&) = delete;
     SettingElement& operator=(const SettingElement&) = delete;
 
-    /** The moniker of the computer to which a record belongs, whether or not there is such a record. */
+    /** Returns the moniker of a record's computer, whether or not the record exists. */
     Moniker getComputerMoniker(Moniker& elementMoniker);
 
 protected:
     /**
-     * The moniker of a computer's record, whether or not there is one. The setting's own element then
-     * stands on that record, or at the end. For a name that no computer bears it is the text of no node.
+     * Returns the moniker of a computer's record, whether or not the record exists. Moves the setting's element to that
+     * record, or to the end. If no computer has the name, the moniker contains the string form of the empty path.
      */
     Moniker getElementMoniker(Moniker& computerMoniker);
 

@@ -1,7 +1,7 @@
 #pragma once
 
-// Definitions of SettingElement. Included by the source file of each setting element and nowhere else, so
-// that each element's code and trace buffers stand in its own unit.
+// Definitions of SettingElement. Included only by the source file of each setting element, so that its code and trace
+// buffers belong to that translation unit.
 
 #include "KO/Exceptions.h"
 #include "SettingElement.h"
@@ -18,8 +18,8 @@ constexpr const char* computerKey = "Name";
 constexpr const char* elementKey = "InstanceID";
 
 /**
- * Runs a moniker operation. Nothing but the two exception classes that it declares may leave it: that memory is lacking
- * is told as one of them, in a text that needs none; anything else ends the process.
+ * Runs a moniker operation and propagates only InstrumentationException and FrameworkException. Converts std::bad_alloc
+ * to a FrameworkException whose message needs no allocation. Terminates the process on any other exception.
  */
 template <class Operation>
 Moniker throwingOnlyDeclared(Operation operation) {
@@ -36,7 +36,7 @@ Moniker throwingOnlyDeclared(Operation operation) {
     }
 }
 
-/** The value of a moniker's first key of that name. */
+/** Returns the value of the moniker's first key with that name. */
 std::string keyValue(const CallSite& site, Moniker& moniker, const std::string& wanted, const char* keyMissing) {
     const unsigned int count = moniker.getKeyCount();
     for (unsigned int index = 0; index < count; ++index) {
@@ -56,7 +56,7 @@ Moniker singleKeyMoniker(const char* name, const std::string& value) {
     return moniker;
 }
 
-/** Stands the cursor on the computer node of that name, or on none. */
+/** Moves the cursor to the computer node with that name, or to the end. */
 void selectComputer(const CallSite& site, Instrumentation& instrumentation, const std::string& wanted) {
     instrumentation.selectNode(NodeLexicon::NT_COMPUTER);
     for (; instrumentation; ++instrumentation) {

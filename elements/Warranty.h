@@ -7,7 +7,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-/** What the design shared with the lease element needs to know of warranties. */
+/** Traits of warranties for RecordElement. */
 struct WarrantyElementTraits {
     using Base = WarrantyBase;
 
@@ -16,10 +16,10 @@ struct WarrantyElementTraits {
 };
 
 /**
- * The managed element of VELKO_Warranty: the warranties of this computer, one after the other.
+ * The managed element of VELKO_Warranty: a cursor over the warranties of this computer.
  *
- * The getters of the current warranty answer true. They and the setters throw InstrumentationException
- * when no warranty is current.
+ * The getters of the current warranty return true. Getters and setters throw InstrumentationException if there is no
+ * current warranty.
  */
 class Warranty : public RecordElement<WarrantyElementTraits> {
 public:
@@ -27,7 +27,7 @@ public:
     void removeWarranty() { remove(); }
 
     bool getWarrantor(std::string& value) const;
-    bool getCommencementDate(std::string& value) const;  ///< CIM datetime text
+    bool getCommencementDate(std::string& value) const;  ///< CIM datetime string
     bool getDuration(unsigned int& value) const;
 
     void setWarrantor(std::string value);

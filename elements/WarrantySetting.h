@@ -5,7 +5,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-/** What the design that the setting elements share needs to know of warranties. */
+/** Traits of warranties for SettingElement. */
 struct WarrantySettingElementTraits {
     using Element = Warranty;
     static constexpr const char* constructor = "WarrantySetting";
@@ -17,7 +17,7 @@ struct WarrantySettingElementTraits {
     static const TraceSource traceSource;
 };
 
-/** The managed element of VELKO_WarrantySetting: which warranty a computer has, and which computer has a warranty. */
+/** The managed element of VELKO_WarrantySetting: translates between monikers of computers and warranties. */
 class WarrantySetting : public SettingElement<WarrantySettingElementTraits> {
 public:
     Moniker getWarrantyMoniker(Moniker& computerMoniker) { return getElementMoniker(computerMoniker); }
