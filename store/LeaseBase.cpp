@@ -34,7 +34,7 @@ template class RecordTrace<LeaseStoreTraits>;
 template class RecordCache<LeaseStoreTraits>;
 template class RecordBase<LeaseStoreTraits>;
 
-/** Stands below the logger's name and the tables, which its loading uses. */
+/** Defined after the logger's name and the tables, which its constructor uses. */
 LeaseCache LeaseBase::cache;
 
 LeaseCache& LeaseStoreTraits::cache() {

@@ -11,7 +11,7 @@ namespace KO::LeaseWarrantyProvider {
 
 namespace Properties {
 
-/** The properties of a lease record. The numbers are fixed: they stand in the log. */
+/** The properties of a lease record. The numbers are fixed, since they appear in the log. */
 enum class Lease : int {
     InstanceID = 0,
     LeaseTerm = 1,
@@ -30,14 +30,14 @@ enum class Lease : int {
 
 }  // namespace Properties
 
-/** The number of leases in use, which heads the file. */
+/** The number of leases in use, which is the first line of the file. */
 struct LeaseCount {
     unsigned int recordCountLease = 0;
 
     unsigned int& count() { return recordCountLease; }
 };
 
-/** What the design shared with the warranty store needs to know of leases. */
+/** Traits of leases for RecordCache and RecordBase. */
 struct LeaseStoreTraits {
     using Unit = LeaseUnit;
     using Count = LeaseCount;
@@ -49,10 +49,10 @@ struct LeaseStoreTraits {
     static RecordCache<LeaseStoreTraits>& cache();
 };
 
-/** The lease table of the process, kept in Lease.dat. */
+/** The process-wide lease table, stored in Lease.dat. */
 using LeaseCache = RecordCache<LeaseStoreTraits>;
 
-/** A cursor over the lease records, with creation and deletion. */
+/** A cursor over the lease records that can create and delete records. */
 class LeaseBase : public RecordBase<LeaseStoreTraits> {
 public:
     void selectLease(const std::string& instanceId) { select(instanceId); }

@@ -37,8 +37,8 @@ struct RecordStoreNames {
     FixedString selectName;
     FixedString createName;
     FixedString removeName;
-    FixedString fileName;            ///< of the record file in the agent's data directory
-    FixedString countName;           ///< under which the number of records is traced
+    FixedString fileName;            ///< name of the record file in the agent's data directory
+    FixedString countName;           ///< name of the record count in the trace
     FixedString noRecords;           ///< thrown if the count is not 0 and no record is in use
     FixedString notAvailable;        ///< thrown if no record is current
     FixedString identifierExists;    ///< thrown if a record in use has the identifier
@@ -46,45 +46,45 @@ struct RecordStoreNames {
 };
 
 /**
- * The table of one kind of records and its file: what LeaseCache and WarrantyCache share. It is
- * loaded once, with the library, and written back by whoever changes it. The count, which each kind
- * names in its own way, is always the number of records in use.
+ * The table of one kind of records and its file. Base of LeaseCache and WarrantyCache. Loaded once, with the library;
+ * each change rewrites the file. The count, whose name depends on the kind, is always the number of records in use.
  */
 template <class Traits>
 class RecordCache : public Traits::Count {
 public:
-    /** Loads the file. Never fails: a file that is absent, unreadable or too large gives an empty table and count 0. */
+    /**
+     * Loads the file. Never throws: if the file is missing, unreadable or too large, the table is empty and the count
+     * 0.
+     */
     RecordCache() noexcept;
-    /** Releases the table. The file is not written. */
+    /** Frees the table. Does not write the file. */
     ~RecordCache();
     RecordCache(const RecordCache&) = delete;
     RecordCache& operator=(const RecordCache&) = delete;
 
-    /** Rewrites the file from the table. Throws InstrumentationException when it cannot be opened. */
+    /** Rewrites the file from the table. Throws InstrumentationException if the file cannot be opened. */
     void flushCache();
 
-    std::vector<typename Traits::Unit> table{};  ///< in file order, new records at the end, deleted ones included
+    std::vector<typename Traits::Unit> table{};  ///< in file order, then new records; includes deleted records
 
 private:
-    /** Releases the records read so far and logs the reason. */
+    /** Frees the records read so far and logs the reason. */
     void abandonLoading(const CallSite& site, const char* reason) noexcept;
 };
 
 /**
- * A cursor over the process-wide table of one kind of records, with typed property access: the
- * design that LeaseBase and WarrantyBase share. Each has its own table; they share nothing at run
- * time. One cursor belongs to one request.
+ * A cursor over the process-wide table of one kind of records, with typed property access. Base of LeaseBase and
+ * WarrantyBase, which share no data. A cursor belongs to one request.
  *
- * Changes are in the table at once, seen by every other cursor; the record file is rewritten when a
- * cursor that changed something ends its life. The cursor is an index, so another cursor's append
- * does not disturb it.
+ * Changes are visible to every other cursor at once. The destructor of a cursor that changed anything rewrites the
+ * record file. The cursor is an index, so it stays valid when another cursor appends a record.
  *
- * Traits tells the two apart:
+ * Traits defines:
  *   Unit, Property     record type and property numbers
- *   Count              base of the table with the record count, to be had from count()
+ *   Count              base of the table with the record count, returned by count()
  *   traceSource, names trace source and RecordStoreNames of the store
  *   fields             its table of RecordField, in file order
- *   cache()            the one table of the process
+ *   cache()            the process-wide table
  */
 template <class Traits>
 class RecordBase {
@@ -92,45 +92,46 @@ public:
     using Property = typename Traits::Property;
 
     /**
-     * Stands on the first record in use; at the end when the count is 0. Throws InstrumentationException
-     * when the count tells of records and none is in use.
+     * Starts at the first record in use, or at the end if the count is 0. Throws InstrumentationException if the count
+     * is not 0 and no record is in use.
      */
     RecordBase();
 
     /**
-     * Rewrites the record file if this cursor changed anything; that may throw InstrumentationException.
-     * While another exception is leaving, a failure is only logged: the process belongs to the object
-     * manager.
+     * Rewrites the record file if this cursor changed anything. Throws InstrumentationException if that fails. During
+     * stack unwinding, the failure is only logged, since a second exception would terminate the object manager.
      */
     ~RecordBase() noexcept(false);
     RecordBase(const RecordBase&) = delete;
     RecordBase& operator=(const RecordBase&) = delete;
 
-    /** Whether the cursor stands on a record in use. Moves it forward over deleted ones first. */
+    /** Returns whether the cursor is at a record in use. Skips deleted records first. */
     operator bool();
 
-    /** Moves to the next record in use, or to the end; at the end it stays. */
+    /** Moves to the next record in use, or to the end. Does nothing at the end. */
     void operator++();
 
-    /** Moves forward from the current record to the one with the identifier, byte for byte, or to the end. */
+    /** Moves forward, starting at the current record, to the one with the identifier, byte for byte, or to the end. */
     void select(const std::string& instanceId);
 
     /**
-     * Appends a record with its identifier and default values. A cursor that stood on an entry then
-     * stands on the new one, a cursor at the end on the first of the table.
+     * Appends a record with the identifier and default values. Moves a cursor that was at a record to the new one, and
+     * a cursor at the end to the first record of the table.
      * @return true
-     * @throws InstrumentationException when a record in use has the identifier
+     * @throws InstrumentationException if a record in use has the identifier
      */
     bool create(const std::string& instanceId);
 
-    /** Deletes the current record; the cursor stays. Throws InstrumentationException when it is at the end. */
+    /**
+     * Deletes the current record and does not move the cursor. Throws InstrumentationException if the cursor is at the
+     * end.
+     */
     void remove();
 
     /** @name Typed property access
-     * Copies a property of the current record out, or changes it. The getters answer true.
-     * Throws InstrumentationException when the cursor is at the end, when the property is of another
-     * type, and on setting the identifier. A failure changes nothing. Whether the record has been deleted
-     * meanwhile is not looked at.
+     * Reads or changes a property of the current record, even if that record is deleted. The getters return true.
+     * Throws InstrumentationException and changes nothing if the cursor is at the end, if the property has another
+     * type, or if the identifier is set.
      */
     ///@{
     bool getProperty(Property property, std::string& value) const;
@@ -140,7 +141,7 @@ public:
     ///@}
 
 protected:
-    /** Typed access under the name of the calling operation. */
+    /** Typed access, traced under the name of the calling operation. */
     template <class Value>
     bool get(const CallSite& site, Property property, Value& value) const;
     template <class Value>
@@ -159,7 +160,7 @@ private:
 
     bool cacheModified = false;
     std::size_t cursor = end;
-    int exceptionsBefore = std::uncaught_exceptions();  ///< how many were leaving when this cursor was made
+    int exceptionsBefore = std::uncaught_exceptions();  ///< exceptions in flight when the cursor was created
 };
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -1,7 +1,7 @@
 #pragma once
 
-// Definitions of RecordBase, RecordCache and RecordTrace. Included by the source file of each store and nowhere else,
-// so that each store's code and trace buffers stand in its own unit.
+// Definitions of RecordBase, RecordCache and RecordTrace. Included only by the source file of each store, so that its
+// code and trace buffers belong to that translation unit.
 
 #include "KO/Exceptions.h"
 #include "RecordBase.h"
@@ -174,7 +174,7 @@ void RecordBase<Traits>::remove() {
     const Traced traced(site);
     requireCurrent(here(site));
     auto& cache = Traits::cache();
-    // A record that this cursor, which does not move, has deleted already is not counted down again.
+    // The cursor stays at a deleted record; do not decrement the count for it again.
     cache.count() -= cache.table[cursor].inUse ? 1U : 0U;
     cache.table[cursor].inUse = false;
     traceVariable(here(site), Traits::names.countName, cache.count());
@@ -188,7 +188,7 @@ void RecordBase<Traits>::requireCurrent(const CallSite& site) const {
     }
 }
 
-/** The member behind a property, null when the property is of another type or, for writing, read-only. */
+/** Returns the member of a property; null if the property has another type or, for writing, is read-only. */
 template <class Traits>
 template <class Value>
 Value RecordBase<Traits>::Unit::*RecordBase<Traits>::memberOf(Property property, bool forWriting) {

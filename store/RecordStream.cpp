@@ -9,7 +9,7 @@ namespace {
 
 constexpr const char* emptyValue = "*";
 
-/** Reads into a scratch value, since a failed extraction would overwrite a number with 0. */
+/** Reads into a temporary, since a failed extraction sets a number to 0. */
 template <class Value>
 bool extractOrKeep(std::istream& stream, Value& value) {
     Value read{};
@@ -23,7 +23,7 @@ bool extractOrKeep(std::istream& stream, Value& value) {
 }  // namespace
 
 bool extract(std::istream& stream, unsigned int& number) {
-    // Stream extraction wraps a negative number around.
+    // Stream extraction would convert a negative number by wrapping around.
     if ((stream >> std::ws).peek() == '-') {
         stream.setstate(std::ios::failbit);
     }

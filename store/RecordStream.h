@@ -9,27 +9,28 @@
 namespace KO::LeaseWarrantyProvider {
 
 /** @name Reading a field
- * Answers whether the field was there. Where it was not, the stream fails and the value stays as it was.
+ * Returns whether the field was read. On failure, sets the stream's failbit and keeps the value.
  */
 ///@{
-bool extract(std::istream& stream, unsigned int& number);  ///< decimal, also as in "036" or "+36"; no minus sign
-bool extract(std::istream& stream, bool& flag);            ///< the number 0 or 1, also as in "01" or "+1"
-bool extract(std::istream& stream, std::string& word);     ///< up to the next white space
+bool extract(std::istream& stream,
+             unsigned int& number);  ///< decimal, optionally with leading zeros or a plus sign; no minus sign
+bool extract(std::istream& stream, bool& flag);  ///< the number 0 or 1, optionally with leading zeros or a plus sign
+bool extract(std::istream& stream, std::string& word);  ///< up to the next white space
 ///@}
 
 /**
- * Writes what a line of a record file holds for a text. Allocates nothing: a file that is being rewritten is not given
- * up for lack of memory.
+ * Writes a string in the format of a record file. Does not allocate memory, so that a rewrite cannot fail halfway for
+ * lack of memory.
  */
 void writeEscaped(std::ostream& stream, const std::string& text, TextForm form);
 
-/** The text for which a line of a record file stands. */
+/** Returns the string that a line of a record file represents. */
 std::string unescaped(const std::string& line, TextForm form);
 
-/** Ends a line and hands it to the operating system: a record file is flushed line by line. */
+/** Ends and flushes a line: a record file is flushed line by line. */
 void endLine(std::ostream& stream);
 
-/** Reads a record's fields in the table's order, undoing the escapes of texts. A missing field stays as it was. */
+/** Reads a record's fields in the table's order and unescapes its strings. A missing field keeps its value. */
 template <class Unit, class Fields>
 void readRecord(std::istream& stream, Unit& unit, const Fields& fields) {
     for (const auto& field : fields) {
@@ -41,7 +42,7 @@ void readRecord(std::istream& stream, Unit& unit, const Fields& fields) {
     }
 }
 
-/** Bytes of memory that a record's texts take, but for those short ones that stand in the record itself. */
+/** Returns the heap memory of a record's strings in bytes. Short strings are stored in the record itself. */
 template <class Unit, class Fields>
 std::size_t bytesOfTexts(const Unit& unit, const Fields& fields) {
     const std::size_t shortest = std::string().capacity();
@@ -55,7 +56,7 @@ std::size_t bytesOfTexts(const Unit& unit, const Fields& fields) {
     return bytes;
 }
 
-/** Writes the fields of a record, one a line, in the table's order. */
+/** Writes the fields of a record in the table's order, one per line. */
 template <class Unit, class Fields>
 void writeRecord(std::ostream& stream, const Unit& unit, const Fields& fields) {
     for (const auto& field : fields) {

@@ -12,29 +12,32 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-/** Room made for records before any is known. */
+/** Capacity that is reserved before the file is read. */
 constexpr std::size_t reservedRecords = 10;
 
 /**
- * Whether a number of objects of a size fits into the physical memory of this machine; true when that is unknown.
- * Limits of the process are not considered.
+ * Returns whether `count` objects of `size` bytes fit into physical memory; true if its size is unknown. Ignores the
+ * limits of the process.
  */
 bool memoryCanHold(std::size_t count, std::size_t size);
 
-/** Throws std::bad_alloc when memory cannot hold the objects. */
+/** Throws std::bad_alloc if the objects do not fit into physical memory. */
 void requireMemory(std::size_t count, std::size_t size);
 
-/** The path of a file of the agent's data directory. */
+/** Returns the path of a file in the agent's data directory. */
 std::string dataFilePath(const char* fileName);
 
-/** Opens a record file in the classic locale: the process's own locale may group digits. */
+/** Opens a record file in the classic locale, since the global locale may group digits. */
 template <class Stream>
 void openRecordFile(Stream& stream, const std::string& path, std::ios::openmode mode) {
     stream.imbue(std::locale::classic());
     stream.open(path, mode);
 }
 
-/** loadRecords, with memory reserved for a multiple of the declared records if they are more than reservedRecords. */
+/**
+ * Implements loadRecords. If the file declares more than reservedRecords records, reserves memory for `reserve` times
+ * that number.
+ */
 template <class Unit>
 void readRecords(const std::string& path, unsigned int& count, std::vector<Unit>& table, std::size_t reserve) {
     table.reserve(reservedRecords);
@@ -57,7 +60,7 @@ void readRecords(const std::string& path, unsigned int& count, std::vector<Unit>
     bool isAtEnd = false;
     for (unsigned int record = 0; record < declared; ++record) {
         stream >> scratch;
-        if (!isAtEnd && !stream.good()) {  // from here on all are copies
+        if (!isAtEnd && !stream.good()) {  // all further records are copies
             isAtEnd = true;
             requireMemory(declared - record, sizeof(Unit) + bytesOfTexts(scratch));
         }
@@ -69,14 +72,15 @@ void readRecords(const std::string& path, unsigned int& count, std::vector<Unit>
 /**
  * Reads a record file into an empty table.
  *
- * The count at the head is believed: a shorter file yields the declared number of records, a missing
- * field keeping the value of the record before. A count that is no number makes the file unreadable. Memory is
- * reserved for twice the records, and only for the records where that is refused.
+ * Trusts the count in the first line: if the file is shorter, creates the declared number of records, and a missing
+ * field keeps the value of the preceding record. A count that is not a number makes the file unreadable. Reserves
+ * memory for twice the number of records or, if that fails, for the number of records.
  *
- * @param count receives the number of records; unchanged, like the table, for an unreadable file
- * @throws std::bad_alloc when memory cannot hold the declared records, or the copies of the last one among them, or
- *         when the process is refused memory; std::ios_base::failure when the file cannot be read to its end. The
- *         table may then hold some records
+ * @param count receives the number of records; unchanged, like the table, if the file is unreadable
+ * @throws std::bad_alloc if the declared records, or the copies of the last one read, do not fit into memory or an
+ *         allocation fails
+ * @throws std::ios_base::failure if the file cannot be read to its end. In both cases the table may contain some
+ *         records.
  */
 template <class Unit>
 void loadRecords(const std::string& path, unsigned int& count, std::vector<Unit>& table) {
@@ -89,13 +93,13 @@ void loadRecords(const std::string& path, unsigned int& count, std::vector<Unit>
 }
 
 /**
- * Rewrites a record file in place: the count, then each record in use.
- * Lack of memory shows before the file is touched.
- * @return false when the file cannot be opened for writing; a write that fails is not noticed
+ * Rewrites a record file in place: the count, then each record in use. If memory is short, fails before it opens the
+ * file.
+ * @return false if the file cannot be opened for writing; write errors are ignored
  */
 template <class Unit>
 bool writeRecords(const std::string& path, unsigned int count, const std::vector<Unit>& table) {
-    char buffer[BUFSIZ];  // opening empties the file: from then on nothing may be allocated
+    char buffer[BUFSIZ];  // opening truncates the file; do not allocate after that
     std::ofstream stream;
     stream.rdbuf()->pubsetbuf(buffer, sizeof buffer);
     openRecordFile(stream, path, std::ios::out | std::ios::trunc);

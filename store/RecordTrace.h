@@ -5,11 +5,10 @@
 namespace KO::LeaseWarrantyProvider {
 
 /**
- * Traces the making and copying of records, as a base of each record type. It holds nothing; the
- * record types keep the copying that the compiler writes. Moves, as a growing table makes them, and
- * destruction are not traced.
+ * Traces construction and copying of records. An empty base of the record types, which use compiler-generated copying.
+ * Does not trace destruction or moves, such as those of a growing table.
  *
- * Traits is that of the records' store.
+ * Traits is the traits class of the records' store.
  */
 template <class Traits>
 class RecordTrace {

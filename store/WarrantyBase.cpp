@@ -25,7 +25,7 @@ template class RecordTrace<WarrantyStoreTraits>;
 template class RecordCache<WarrantyStoreTraits>;
 template class RecordBase<WarrantyStoreTraits>;
 
-/** Stands below the logger's name and the tables, which its loading uses. */
+/** Defined after the logger's name and the tables, which its constructor uses. */
 WarrantyCache WarrantyBase::cache;
 
 WarrantyCache& WarrantyStoreTraits::cache() {

@@ -11,7 +11,7 @@ namespace KO::LeaseWarrantyProvider {
 
 namespace Properties {
 
-/** The properties of a warranty record. The numbers are fixed: they stand in the log. */
+/** The properties of a warranty record. The numbers are fixed, since they appear in the log. */
 enum class Warranty : int {
     InstanceID = 0,
     Warrantor = 1,
@@ -21,14 +21,14 @@ enum class Warranty : int {
 
 }  // namespace Properties
 
-/** The number of warranties in use, which heads the file. */
+/** The number of warranties in use, which is the first line of the file. */
 struct WarrantyCount {
     unsigned int recordCountWarranty = 0;
 
     unsigned int& count() { return recordCountWarranty; }
 };
 
-/** What the design shared with the lease store needs to know of warranties. */
+/** Traits of warranties for RecordCache and RecordBase. */
 struct WarrantyStoreTraits {
     using Unit = WarrantyUnit;
     using Count = WarrantyCount;
@@ -40,10 +40,10 @@ struct WarrantyStoreTraits {
     static RecordCache<WarrantyStoreTraits>& cache();
 };
 
-/** The warranty table of the process, kept in Warranty.dat. */
+/** The process-wide warranty table, stored in Warranty.dat. */
 using WarrantyCache = RecordCache<WarrantyStoreTraits>;
 
-/** A cursor over the warranty records, with creation and deletion. */
+/** A cursor over the warranty records that can create and delete records. */
 class WarrantyBase : public RecordBase<WarrantyStoreTraits> {
 public:
     void selectWarranty(const std::string& instanceId) { select(instanceId); }
