@@ -3,18 +3,18 @@
 #include <exception>
 #include <string>
 
-/** The names that the agent's log filters select by. */
+/** Logger names that the agent's log filters select by. */
 namespace KO::LeaseWarrantyProvider::LoggerNames {
 
-/** Logger of all units but the two below. */
+/** Logger of all translation units except the two below. */
 constexpr const char* provider = "Tarvik.LeaseAndWarrantyProvider";
 
-/** Logger of the units OstrelAgent and AssetIDDetails: shorter, and meant so. */
+/** Logger of OstrelAgent.cpp and AssetIDDetails.cpp. The shorter name is intentional. */
 constexpr const char* shortened = "Tarvik.LeaseWarrantyProvider";
 
 /**
- * A name as a unit keeps it. The units' names are made while the library is loaded, which must not fail: where memory
- * is lacking then, it is a shorter name that needs none.
+ * Returns a logger's name as a string. The names are initialized while the library is loaded, which must not fail: if
+ * memory is short, returns a shorter name that needs no allocation.
  */
 inline std::string loggerName(const char* name) noexcept {
     try {

@@ -10,32 +10,32 @@
 #include <utility>
 
 /**
- * Tracing of the provider's functions. It throws nothing: a line that cannot be written is lost.
+ * Tracing of the provider's functions. Never throws: a line that cannot be written is dropped.
  *
- * A source unit binds its logger and file name once, in a TraceSource named `traceSource`. A function then
- * traces its entry and its exit with one line at its head:
+ * A source file defines a TraceSource named `traceSource` with its logger and file name. A function then traces its
+ * entry and its exit with its first line:
  *
  *     const Traced traced(at(traceSource), label::instanceId, instanceId);
  *
- * Every line goes to the log channel and then to the trace channel. Like the formatting functions,
- * what stands in the unnamed namespace exists once a unit, with the unit's own buffers.
+ * Every line is written to the log channel, then to the trace channel. Like the formatting functions, the functions in
+ * the unnamed namespace exist once per translation unit, with separate buffers.
  */
 namespace KO {
 
 /** Levels of log records. */
 namespace Level {
-constexpr int error = 3000;   ///< failures, and the flow of control where an operator should see it
-constexpr int flow = 4000;    ///< the ordinary flow of control
-constexpr int detail = 6000;  ///< written only by a logger that is raised to it: one message of the asset data
+constexpr int error = 3000;   ///< failures, and control flow that operators should see
+constexpr int flow = 4000;    ///< ordinary control flow
+constexpr int detail = 6000;  ///< one message of the asset data; loggers rarely enable this level
 }  // namespace Level
 
-/** What all trace lines of a source unit share. */
+/** Logger and file name that all trace lines of a source file share. */
 struct TraceSource {
     const std::string& logger;
     const char* file;
 };
 
-/** Where in a unit a line comes from, and how loud it is. */
+/** Source position and level of a trace line. */
 struct CallSite {
     const TraceSource* source;
     int level;
@@ -43,28 +43,34 @@ struct CallSite {
     unsigned int line;
 };
 
-/** The place of the call itself. The last two arguments are for code that works under another's name. */
+/**
+ * Returns the position of the call. The last two arguments are for code that is traced under the name of another
+ * function.
+ */
 inline CallSite at(const TraceSource& source, int level = Level::flow, const char* function = __builtin_FUNCTION(),
                    unsigned int line = __builtin_LINE()) {
     return {&source, level, function, line};
 }
 
-/** The place of the call itself, under the name and at the level of the function that it works for. */
+/** Returns the position of the call, with the function name and level of the caller. */
 inline CallSite here(const CallSite& caller, unsigned int line = __builtin_LINE()) {
     return {caller.source, caller.level, caller.function, line};
 }
 
 namespace {
 
-/** Whether somebody may read a line of the site. A logging library that cannot tell is given every line. */
+/**
+ * Returns whether either channel may write a line of this site; true if the logging library does not provide
+ * RZLogger::admits.
+ */
 inline bool isWanted(const CallSite& site) noexcept {
     using RZLog::RZLogger;
     return RZLogger::admits == nullptr || RZLogger::admits(site.source->logger, site.level);
 }
 
 /**
- * Writes one line to both channels. The text is formatted anew for each: the buffer that it stands
- * in belongs to nobody between two calls. A line that memory cannot hold is lost, never the request.
+ * Writes one line to both channels. Formats it again for the second channel, since another call may overwrite the
+ * buffer in between. A line that does not fit into memory is dropped.
  */
 template <class Format>
 void writeLine(const CallSite& site, Format format) noexcept {
@@ -85,7 +91,7 @@ void writeLine(const CallSite& site, Format format) noexcept {
     }
 }
 
-/** A parameter list: labels, each followed by its value. */
+/** Returns a parameter list: labels, each followed by its value. */
 template <class... Parts>
 std::string parameterList(const Parts&... parts) {
     RZLog::RZMessageBuffer list;
@@ -93,7 +99,7 @@ std::string parameterList(const Parts&... parts) {
     return list.str(list);
 }
 
-/** Writes one line of a kind, with a parameter list if there are parts. */
+/** Writes one line of a type, with a parameter list if there are parts. */
 template <class... Parts>
 void traceLine(const CallSite& site, MessageType type, const Parts&... parts) noexcept {
     if (!isWanted(site)) {
@@ -112,9 +118,9 @@ void traceLine(const CallSite& site, MessageType type, const Parts&... parts) no
 }
 
 /**
- * Traces a function's entry when made and its exit when the function is left normally; a function
- * left by an exception has no exit line. Both carry the line at which it is made. The parts are labels
- * and values; a variable is shown at exit with the value that it has then.
+ * Traces a function's entry when constructed and its exit when destroyed, unless an exception leaves the function. Both
+ * lines have the line number of the constructor call. The parts are labels and values; the exit line contains the
+ * current values of variables.
  */
 template <class... Parts>
 class Traced {
@@ -146,19 +152,19 @@ private:
 
     CallSite site;
     std::tuple<Parts...> parts;
-    int exceptions = unwanted;  ///< how many were leaving at the entry
+    int exceptions = unwanted;  ///< exceptions in flight at the entry
 };
 
-/** Variables are referred to; what exists only in the call is kept. */
+/** Stores references to variables and copies of temporaries. */
 template <class... Arguments>
 Traced(const CallSite&, Arguments&&...) -> Traced<Arguments...>;
 
-/** Traces a call that is only noted. */
+/** Traces a call without entry and exit. */
 [[maybe_unused]] void traceMethod(const CallSite& site) noexcept {
     traceLine(site, MT_METHOD);
 }
 
-/** Traces a text. */
+/** Traces a message. */
 [[maybe_unused]] void traceMessage(const CallSite& site, const char* text) noexcept {
     writeLine(site, [&] { return trace(text, site.source->file, site.line, MT_MESSAGE); });
 }
@@ -168,7 +174,7 @@ Traced(const CallSite&, Arguments&&...) -> Traced<Arguments...>;
     writeLine(site, [&] { return trace(name, site.source->file, site.line, value.c_str()); });
 }
 
-/** Traces a number's value; a flag counts as 1 or 0. */
+/** Traces the value of a number, or of a flag as 1 or 0. */
 [[maybe_unused]] void traceVariable(const CallSite& site, const char* name, unsigned int value) noexcept {
     writeLine(site, [&] { return trace(name, site.source->file, site.line, value); });
 }
@@ -205,17 +211,17 @@ constexpr const char* broker = " _broker=";
 constexpr const char* context = " _context=";
 }  // namespace label
 
-/** The rule. Every request stands between two of them in the log. */
+/** Separator line before and after each request in the log. */
 constexpr const char* requestRule = "==============================================================================";
 
-/** Where the marker lines of a request are filed: the framework's trace header, at lines of its own. */
+/** File name and line numbers of the lines that mark a request: those of the framework's trace header. */
 constexpr const char* markerFile = "sdk/kolib/include/Trace.h";
 constexpr unsigned int entryRuleLine = 336;
 constexpr unsigned int entryLine = 337;
 constexpr unsigned int exitLine = 348;
 constexpr unsigned int exitRuleLine = 349;
 
-/** Logs the rule and the ENTERING line of an entry point. */
+/** Logs the separator and the ENTERING line of an entry point. */
 [[maybe_unused]] void markProviderEntry(const std::string& logger, const char* function, const char* file,
                                         unsigned int line) noexcept {
     const TraceSource markers{logger, markerFile};
@@ -224,7 +230,7 @@ constexpr unsigned int exitRuleLine = 349;
               [&] { return trace(function, file, line, MT_ENTERING); });
 }
 
-/** Logs the EXITING line of an entry point and the rule. */
+/** Logs the EXITING line of an entry point and the separator. */
 [[maybe_unused]] void markProviderExit(const std::string& logger, const char* function, const char* file,
                                        unsigned int line) noexcept {
     const TraceSource markers{logger, markerFile};

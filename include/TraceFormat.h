@@ -7,26 +7,26 @@
 #include <limits>
 
 /**
- * The texts of trace lines. Each formatting function owns one buffer, shared by all its calls: a
- * result is valid until the next call of the same function. Texts are cut at 511 characters.
+ * Formatting of trace lines. Each formatting function has one buffer for all its calls: a result is valid until the
+ * next call of the same function. Strings are truncated at 511 characters.
  *
- * The functions are static on purpose: each source unit has its own copies, and so its own buffers.
+ * The functions are static, so that each translation unit has separate copies and buffers.
  */
 namespace KO {
 
-/** The kind of a trace line. Any other number counts as MT_ENTERING. */
+/** The type of a trace line. Any other number means MT_ENTERING. */
 enum MessageType : int {
     MT_ENTERING = 0,  ///< function entry
     MT_EXITING = 1,   ///< function exit
-    MT_METHOD = 2,    ///< a call that is only noted
-    MT_MESSAGE = 3,   ///< a free text, normally an error text
+    MT_METHOD = 2,    ///< call without entry and exit
+    MT_MESSAGE = 3,   ///< message, normally an error
 };
 
 constexpr std::size_t traceBufferSize = 512;
 
 /**
- * A text in a buffer of its own size, which is cleared first and cut where the buffer ends. Lines are made
- * in great numbers, hence without sprintf.
+ * A string in a fixed buffer. Clears the buffer first and truncates the string at its end. Avoids sprintf, since
+ * tracing is frequent.
  */
 class TraceText {
 public:
@@ -39,7 +39,7 @@ public:
         append(shownText, std::strlen(shownText));
     }
 
-    /** A number counts as signed, so the highest ones are shown as negative. */
+    /** Formats the number as signed, so large numbers appear as negative. */
     void append(unsigned int number) {
         char digits[std::numeric_limits<int>::digits10 + 2];
         append(digits, static_cast<std::size_t>(
@@ -57,7 +57,7 @@ private:
     char* end;
 };
 
-/** Puts texts and numbers together in the buffer. @return the buffer */
+/** Concatenates strings and numbers in the buffer and returns it. */
 template <class... Parts>
 static char* formatTrace(char (&buffer)[traceBufferSize], Parts... parts) {
     TraceText text(buffer);
@@ -66,8 +66,8 @@ static char* formatTrace(char (&buffer)[traceBufferSize], Parts... parts) {
 }
 
 /**
- * The line of a function's entry, exit or call, or of a message.
- * @param function the function's plain name; for MT_MESSAGE the message text instead
+ * Formats the line of a function's entry, exit or call, or of a message.
+ * @param function the function's plain name; for MT_MESSAGE the message instead
  */
 [[maybe_unused]] static char* trace(const char* function, const char* file, unsigned int line, MessageType type) {
     static char buffer[traceBufferSize];
@@ -83,7 +83,7 @@ static char* formatTrace(char (&buffer)[traceBufferSize], Parts... parts) {
     }
 }
 
-/** As trace, with a parameter list at the end. */
+/** Formats a line like trace(), followed by a parameter list. */
 [[maybe_unused]] static char* tracepara(const char* function, const char* file, unsigned int line,
                                         const char* parameters, MessageType type) {
     static char buffer[traceBufferSize];
@@ -102,13 +102,13 @@ static char* formatTrace(char (&buffer)[traceBufferSize], Parts... parts) {
     }
 }
 
-/** The line that tells a text variable's value. */
+/** Formats the line with the value of a string variable. */
 [[maybe_unused]] static char* trace(const char* name, const char* file, unsigned int line, const char* value) {
     static char buffer[traceBufferSize];
     return formatTrace(buffer, "VARIABLE: '", name, "' has Value '", value, "' at line ", line, " in ", file);
 }
 
-/** The line that tells a number's value. */
+/** Formats the line with the value of a number. */
 [[maybe_unused]] static char* trace(const char* name, const char* file, unsigned int line, unsigned int value) {
     static char buffer[traceBufferSize];
     return formatTrace(buffer, "VARIABLE: '", name, "' has Value '", value, "' at line ", line, " in ", file);
