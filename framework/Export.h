@@ -1,7 +1,4 @@
 #pragma once
 
-/**
- * Marks a declaration that is seen outside its shared library. Everything else is compiled with
- * hidden visibility.
- */
+/** Exports a declaration from its shared library. The default visibility is hidden. */
 #define KO_EXPORT __attribute__((visibility("default")))

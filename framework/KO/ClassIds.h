@@ -1,6 +1,6 @@
 #pragma once
 
-/** The numbers by which the agent framework knows CIM classes, as ProviderUtilities::getClassId gives them. */
+/** CIM class ids of the agent framework, as ProviderUtilities::getClassId returns them. */
 namespace KO::ClassId {
 
 constexpr unsigned short unknown = 0;

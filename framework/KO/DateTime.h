@@ -9,18 +9,18 @@ namespace KO {
 class DateTimeAccess;
 
 /**
- * A point in time with its offset from UTC, or no date at all. Its text is the 25-character CIM
- * datetime, made and read by KO::Utils. Copies are independent.
+ * A point in time with its offset from UTC, or an unset date. KO::Utils converts it to and from the 25-character CIM
+ * datetime string. Copies are independent.
  */
 class KO_EXPORT DateTime {
 public:
-    /** No date. */
+    /** Creates an unset date. */
     DateTime();
 
     /**
-     * A date from the clock. A moment outside of the years 0 to 9999 is no date.
-     * @param seconds seconds since 1970-01-01 00:00 UTC, as time() gives them
-     * @param kind    the form to be shown: 3 is local time with its offset, anything else UTC
+     * Creates a date from the clock. A time outside the years 0 to 9999 is unset.
+     * @param seconds seconds since 1970-01-01 00:00 UTC, as returned by time()
+     * @param kind 3 for local time with its offset, any other number for UTC
      */
     DateTime(long seconds, unsigned int kind);
 

@@ -8,10 +8,10 @@
 namespace KO {
 
 /**
- * Declares an exception with an English message.
+ * Declares an exception class with an English message.
  *
- * The exceptions are thrown by value and caught by reference, across the borders of the provider, the framework and
- * the logging library. Their visibility is therefore the default one.
+ * The exceptions are thrown by value and caught by reference in other libraries: the provider, the framework and the
+ * logging library. They therefore have default visibility.
  */
 #define KO_EXCEPTION_CLASS(Name)                                               \
     class KO_EXPORT Name : public std::exception {                             \
@@ -21,20 +21,20 @@ namespace KO {
         Name& operator=(const Name&) = default;                                \
         ~Name() override = default;                                            \
                                                                                \
-        /** The message. Valid as long as the exception. */                    \
+        /** Returns the message, which is valid as long as the exception. */   \
         const char* what() const noexcept override { return message.c_str(); } \
                                                                                \
     private:                                                                   \
         std::string message;                                                   \
     }
 
-/** A record or a node of the managed system is missing, or has no such property. */
+/** A record or a node of the managed system does not exist, or lacks a property. */
 KO_EXCEPTION_CLASS(InstrumentationException);
 
-/** An operation of the agent framework failed, or its argument is not usable. */
+/** An operation of the agent framework failed, or its argument is invalid. */
 KO_EXCEPTION_CLASS(FrameworkException);
 
-/** The object manager did not return what the provider needs. */
+/** The object manager did not return a required object. */
 KO_EXCEPTION_CLASS(ProviderException);
 
 #undef KO_EXCEPTION_CLASS

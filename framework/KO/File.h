@@ -7,16 +7,16 @@
 
 namespace KO {
 
-/** How File::open and PropertyFile::open open a file. */
+/** Modes of File::open and PropertyFile::open. */
 enum FileMode : unsigned long {
     FILE_MODE_READ = 1,   ///< for reading; the file must exist
-    FILE_MODE_WRITE = 3,  ///< for writing; created if absent, never truncated by opening
+    FILE_MODE_WRITE = 3,  ///< for writing; created if it does not exist, never truncated by opening
 };
 
-/** One file of the agent, named by a wide path. */
+/** A file of the agent, named by a wide path. */
 class KO_EXPORT File {
 public:
-    /** A file's path, as a type of its own. Copies are independent. */
+    /** The path of a file. Copies are independent. */
     class KO_EXPORT Path {
     public:
         explicit Path(const std::wstring& path);
@@ -24,7 +24,7 @@ public:
         Path& operator=(const Path& other);
         ~Path();
 
-        /** The path as it was given. */
+        /** Returns the path that was passed to the constructor. */
         std::wstring text() const;
 
     private:
@@ -32,7 +32,7 @@ public:
         std::unique_ptr<Implementation> implementation;
     };
 
-    /** Names a file; nothing is opened. */
+    /** Sets the path without opening the file. */
     explicit File(const std::wstring& path);
 
     /** Closes the file if it is open. */
@@ -41,19 +41,15 @@ public:
     File& operator=(const File&) = delete;
 
     /**
-     * Opens the file in a FileMode. Mode 3 creates it, empty, if it is absent. A file that is open
-     * already is closed first.
-     * @throws FrameworkException when it cannot be opened or is no ordinary file, saying why
+     * Opens the file in a FileMode; mode 3 creates an empty file if there is none. Closes the file first if it is open.
+     * @throws FrameworkException with the reason, if the file cannot be opened or is not a regular file
      */
     void open(unsigned long mode);
 
-    /** Closes the file; without an open file nothing happens. */
+    /** Closes the file if it is open. */
     void close();
 
-    /**
-     * Whether something of that name exists; a symbolic link exists if what it leads to does. False
-     * also when that cannot be found out.
-     */
+    /** Returns whether a file of any type exists at the path. Follows symbolic links. Returns false on errors. */
     static bool exists(const std::wstring& path);
 
 private:

@@ -9,52 +9,51 @@
 namespace KO {
 
 /**
- * A cursor over the agent's instrumentation tree: the nodes that stand for the managed system and
- * its parts.
+ * A cursor over the agent's instrumentation tree, whose nodes represent the managed system and its parts.
  *
- * A new cursor stands on no node. Each selection replaces the one before it. The tree does not change
- * under a cursor. A cursor belongs to one thread.
+ * A new cursor has no current node. Each selection replaces the preceding one. The tree does not change while a cursor
+ * exists. A cursor belongs to one thread.
  */
 class KO_EXPORT Instrumentation {
 public:
-    /** A cursor standing on no node. May throw InstrumentationException when there is no tree. */
+    /** Creates a cursor without a current node. May throw InstrumentationException if there is no tree. */
     Instrumentation();
     ~Instrumentation();
     Instrumentation(const Instrumentation&) = delete;
     Instrumentation& operator=(const Instrumentation&) = delete;
 
-    /** Selects all nodes of a type, in tree order, and stands on the first (none: on no node). */
+    /** Selects all nodes of a type in tree order and moves to the first, if any. */
     void selectNode(NodeLexicon::NodeType type);
 
-    /** Selects the one node at a path, as getPathToNode gives it (none there: stands on no node). */
+    /** Selects the node at a path that getPathToNode returned, if it exists. */
     void selectNode(const std::string& path);
 
-    /** Whether the cursor stands on a node. */
+    /** Returns whether there is a current node. */
     operator bool();
 
-    /** Moves to the next selected node; past the last, stands on none. There it stays. */
+    /** Moves to the next selected node. After the last one, there is no current node. */
     void operator++();
 
     /**
      * Reads a property of the current node.
-     * @param value receives the text; untouched when the answer is false
-     * @return false when the node has no such property or the cursor stands on no node
+     * @param value receives the value; unchanged if the result is false
+     * @return false if the node has no such property or there is no current node
      */
     bool getProperty(NodeLexicon::Properties property, std::string& value);
 
-    /** The current node's path, opaque to callers; empty when the cursor stands on no node. */
+    /** Returns the current node's path, an opaque string; empty if there is no current node. */
     std::string getPathToNode();
 
-    /** The path of the managed computer: of the first computer node, empty if there is none. */
+    /** Returns the path of the managed computer, which is the first computer node; empty if there is none. */
     std::string getPathToComputer();
 
     /**
-     * The printable text form of a path. It has no white space and no underscore, so that record
-     * files keep it unchanged. The empty path gives the empty text.
+     * Returns the printable string form of a path. It contains no white space and no underscores, so that record files
+     * do not change it. The empty path yields the empty string.
      */
     std::string convertPathToString(const std::string& path);
 
-    /** The inverse of convertPathToString. A text that is no text form of a path is given back. */
+    /** Inverse of convertPathToString. Returns a string that is not the string form of a path unchanged. */
     std::string convertStringToPath(const std::string& text);
 
 private:

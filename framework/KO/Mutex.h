@@ -6,7 +6,7 @@
 
 namespace KO {
 
-/** A lock between the threads of a process. Not recursive. */
+/** A mutex for the threads of a process. Not recursive. */
 class KO_EXPORT Mutex {
 public:
     Mutex();
@@ -15,14 +15,14 @@ public:
     Mutex& operator=(const Mutex&) = delete;
 
     /**
-     * Waits for the lock and takes it.
-     * @param timeout milliseconds to wait at most; 0xFFFFFFFF waits without limit
-     * @throws FrameworkException when the time is over, when this thread has the lock already, or when memory was
-     *         lacking as the mutex was made
+     * Acquires the lock.
+     * @param timeout maximum wait in milliseconds; 0xFFFFFFFF waits without limit
+     * @throws FrameworkException on timeout, if this thread already holds the lock, or if the constructor was out of
+     *         memory
      */
     void lock(unsigned long timeout);
 
-    /** Gives the lock back. Only the thread that holds it may; for any other nothing happens. */
+    /** Releases the lock. Does nothing if the calling thread does not hold it. */
     void unlock();
 
 private:

@@ -10,33 +10,31 @@ namespace KO {
 class PropertyFileAccess;
 
 /**
- * A file of named text values. Its entries are read and written with the operations of KO::Utils.
+ * A file of named string values. KO::Utils reads and writes its entries.
  *
- * Entries keep their order, and those that nobody writes are kept as they are. A file opened for
- * writing is replaced as a whole, and only by close() after something was written: whoever reads
- * meanwhile, or after a crash, finds the old content or the new, never a mixture.
+ * Entries keep their order; unchanged entries keep their values. If anything was written, close() replaces the file
+ * atomically: concurrent readers, and readers after a crash, see either the old or the new content.
  */
 class KO_EXPORT PropertyFile {
 public:
-    /** Names a property file; nothing is opened. */
+    /** Sets the path without opening the file. */
     explicit PropertyFile(const File::Path& path);
 
-    /** Drops what was written since open() unless close() committed it. */
+    /** Discards unwritten changes if close() was not called. */
     ~PropertyFile();
     PropertyFile(const PropertyFile&) = delete;
     PropertyFile& operator=(const PropertyFile&) = delete;
 
     /**
-     * Reads the whole file. FILE_MODE_READ wants it to exist; FILE_MODE_WRITE creates it, empty, if
-     * it is absent. What was written since an earlier open() without close() is dropped.
-     * @throws FrameworkException when it cannot be opened or read
+     * Reads the complete file. FILE_MODE_READ requires it to exist; FILE_MODE_WRITE creates an empty file if there is
+     * none. Discards the changes since an earlier open() without close().
+     * @throws FrameworkException if the file cannot be opened or read
      */
     void open(unsigned long mode);
 
     /**
-     * Commits what was written and closes the file; without an open file nothing happens.
-     * @throws FrameworkException when the new content cannot be stored; the old one then stands, and
-     *         the file is closed all the same
+     * Writes the changes and closes the file. Does nothing if no file is open.
+     * @throws FrameworkException if the new content cannot be stored; the file is then unchanged and closed
      */
     void close();
 

@@ -11,55 +11,55 @@ namespace KO {
 class Moniker;
 
 /**
- * What CIM providers of the agent share: class ids, and typed access to CMPI object paths and
- * instances through their own function tables.
+ * Functions that the agent's CIM providers share: class ids, and typed access to CMPI object paths and instances
+ * through their function tables.
  *
- * Objects passed in are borrowed. Object paths and instances that are made here are made through
- * the broker and belong to it; nobody releases them. A null pointer, a failing or missing broker
- * function or a value of an unexpected type never crashes and never throws: reads answer that the
- * value is absent, makers answer null, writers do nothing.
+ * Arguments are borrowed. New object paths and instances are created through the broker, which owns them; the caller
+ * must not release them. The functions never throw and never crash on a null pointer, a missing or failing broker
+ * function or a value of an unexpected type: reading functions then return that there is no value, creating functions
+ * return null, and writing functions do nothing.
  */
 class KO_EXPORT ProviderUtilities {
 public:
     /** @name Class ids
-     * The 16-bit number of a CIM class, whose name is compared without regard to letter case.
-     * 0 for a class unknown to the agent and for a null path or name.
+     * Returns the 16-bit number of a CIM class; 0 if the agent does not know the class, or if the path or name is null.
+     * Class names are case-insensitive.
      */
     ///@{
     static unsigned short getClassId(const CMPIObjectPath* path);
     static unsigned short getClassId(const char* className);
     ///@}
 
-    /** The path's namespace; empty when it has none. */
+    /** Returns the path's namespace; empty if it has none. */
     static std::string getNamespace(const CMPIObjectPath* path);
 
-    /** How many keys the path has; 0xFFFF also stands for more than that. */
+    /** Returns the number of the path's keys, at most 0xFFFF. */
     static unsigned short getKeyCount(const CMPIObjectPath* path);
 
     /**
      * Reads a string key.
-     * @param value receives the text; untouched when the answer is false
-     * @return false when the key is missing, null or not text
+     * @param value receives the value; unchanged if the result is false
+     * @return false if the key is missing, null or not a string
      */
     static bool getKeyProperty(const CMPIObjectPath* path, const char* name, std::string& value);
 
-    /** Reads a reference key; the path that is read belongs to the broker. Otherwise as above. */
+    /** Reads a reference key. The returned path belongs to the broker. Otherwise like the string overload. */
     static bool getKeyProperty(const CMPIObjectPath* path, const char* name, CMPIObjectPath** value);
 
-    /** A new path of a class in a namespace, without keys; null when the broker cannot make it. */
+    /** Creates a path of a class in a namespace, without keys. Returns null if the broker cannot create it. */
     static CMPIObjectPath* createObjectPath(const CMPIBroker* broker, const char* className, std::string nameSpace);
 
-    /** Adds a string key, or replaces the value of a key of that name. */
+    /** Adds a string key, or replaces the value of an existing key. */
     static void setKeyProperty(CMPIObjectPath* path, const char* name, const std::string& value);
 
-    /** Adds a reference key, or replaces the value of a key of that name. */
+    /** Adds a reference key, or replaces the value of an existing key. */
     static void setKeyProperty(CMPIObjectPath* path, const char* name, CMPIObjectPath* value);
 
-    /** A new instance of the path's class; null when the broker cannot make it or the path is null. */
+    /** Creates an instance of the path's class. Returns null if the broker cannot create it or the path is null. */
     static CMPIInstance* createInstance(const CMPIBroker* broker, CMPIObjectPath* path);
 
     /** @name Setting properties of an instance
-     * One overload a CIM type: string, uint16, uint32, boolean, reference.
+     * One overload per CIM type: string, uint16, uint32, boolean, reference.
      */
     ///@{
     static void setProperty(CMPIInstance* instance, const char* name, std::string& value);
@@ -70,25 +70,24 @@ public:
     ///@}
 
     /**
-     * Sets a property from text.
-     * @param isDateTime true: the text is a CIM datetime and the property is of type datetime. A text
-     *                   that is empty, all zeros ("00000000000000.000000-000") or no valid CIM
-     *                   datetime sets the property to null, still of type datetime. False: the
-     *                   property is a string.
+     * Sets a property from a string.
+     * @param isDateTime true sets a property of type datetime from a CIM datetime string. If the string is empty, all
+     *         zeros ("00000000000000.000000-000") or not a valid CIM datetime, the property becomes null. false sets a
+     *         property of type string.
      */
     static void setProperty(const CMPIBroker* broker, CMPIInstance* instance, const char* name, std::string& text,
                             bool isDateTime);
 
     /** @name Reading properties of an instance
-     * Each answers false, and leaves value untouched, when the instance has no such property, when
-     * it is null, or when its value is not of the asked kind.
+     * Each returns false and leaves value unchanged if the instance has no such property, or if its value is null or
+     * has another type.
      */
     ///@{
 
-    /** Reads a string, or a datetime as its 25-character text whichever flag is passed. */
+    /** Reads a string, or a datetime as its 25-character string. The last argument has no effect on the result. */
     static bool getProperty(const CMPIInstance* instance, const char* name, std::string& value, bool isDateTime);
 
-    /** Reads any CIM integer whose value fits. */
+    /** Reads any CIM integer that fits. */
     static bool getProperty(const CMPIInstance* instance, const char* name, unsigned int& value);
 
     /** Reads a boolean. */
@@ -96,12 +95,12 @@ public:
     ///@}
 
     /**
-     * Appends the path's keys, name and value, in the path's order, to a moniker. Integer and boolean
-     * keys are carried as text; keys of other types are left out.
+     * Appends the path's keys to a moniker, in the path's order. Converts integer and boolean keys to strings and omits
+     * keys of other types.
      */
     static void transformObjectPathToMoniker(const CMPIObjectPath* path, Moniker& moniker);
 
-    /** Sets the moniker's keys as string keys of *path; keys that the path has already stay. */
+    /** Adds the moniker's keys to *path as string keys. Keeps the path's other keys. */
     static void transformMonikerToObjectPath(Moniker& moniker, CMPIObjectPath** path);
 };
 

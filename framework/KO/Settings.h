@@ -6,16 +6,15 @@
 
 namespace KO {
 
-/** Switches of the agent's configuration for those who work beside the provider. */
+/** Flags of the agent's configuration for components other than the provider. */
 class KO_EXPORT Settings {
 public:
     /**
-     * A switch by the name of its table and its key, as "gate.refuse_lossy_values".
+     * Reads a flag by the name of its table and key, for example "gate.refuse_lossy_values".
      *
-     * An agent's framework may do without this operation: it is declared weak, and who uses it looks first whether
-     * its address is null.
+     * The function is optional: it is declared weak, so callers must check that its address is not null.
      *
-     * @param otherwise the answer where the configuration does not say
+     * @param otherwise the result if the configuration does not set the flag
      */
     static bool getFlag(const std::string& name, bool otherwise) __attribute__((weak));
 };

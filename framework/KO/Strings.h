@@ -7,20 +7,20 @@
 namespace KO {
 
 /**
- * Conversions between the framework's wide texts and the narrow ones of CIM values and paths.
+ * Conversions between the framework's wide strings and the narrow strings of CIM values and paths.
  *
- * Narrow text is UTF-8; wide text holds one Unicode code point an element. A narrow byte that is
- * not part of valid UTF-8 is carried through the wide form unchanged, so that narrow to wide to
- * narrow gives back the same bytes. None of them throws but for want of memory.
+ * Narrow strings are UTF-8; wide strings contain one Unicode code point per element. A byte that is not part of valid
+ * UTF-8 is preserved, so that a conversion from narrow to wide and back returns the same bytes. The functions throw
+ * only std::bad_alloc.
  */
 
-/** The narrow form of a wide text. A code point that UTF-8 cannot encode becomes U+FFFD. */
+/** Converts a wide string to a narrow one. A code point that UTF-8 cannot encode becomes U+FFFD. */
 KO_EXPORT std::string make_string(const std::wstring& text);
 
-/** A copy of a narrow text, usable as a file path. A null pointer gives the empty text. */
+/** Copies a narrow string, usable as a file path. A null pointer yields the empty string. */
 KO_EXPORT std::string make_string(const char* text);
 
-/** The wide form of a narrow text. */
+/** Converts a narrow string to a wide one. */
 KO_EXPORT std::wstring make_wstring(const std::string& text);
 
 }  // namespace KO

@@ -9,40 +9,40 @@ namespace KO {
 
 class PropertyFile;
 
-/** Reading and writing of property file entries, and the text form of dates. */
+/** Reads and writes property file entries, and converts dates to and from strings. */
 class KO_EXPORT Utils {
 public:
     /**
-     * The text under a key; empty when the key is absent.
-     * @throws FrameworkException when the file is not open
+     * Returns the value of a key; empty if the key does not exist.
+     * @throws FrameworkException if the file is not open
      */
     static std::string ReadStringFromFile(PropertyFile& file, const std::string& key);
 
     /**
-     * The date under a key; no date when the key is absent or its text is no date.
-     * @throws FrameworkException when the file is not open
+     * Returns the date of a key; an unset date if the key does not exist or its value is not a date.
+     * @throws FrameworkException if the file is not open
      */
     static DateTime ReadDateFromFile(PropertyFile& file, const std::string& key);
 
     /**
-     * Sets the text under a key, in place if the key is there, else at the end. Any text is kept
-     * exactly, line breaks included.
-     * @throws FrameworkException when the file is not open for writing
+     * Sets the value of a key, in place if the key exists, otherwise at the end. Values are preserved exactly,
+     * including line breaks.
+     * @throws FrameworkException if the file is not open for writing
      */
     static void WriteStringToFile(PropertyFile& file, const std::string& key, const std::string& value);
 
-    /** Sets the date under a key; otherwise as WriteStringToFile. No date is written as empty text. */
+    /** Sets the date of a key. Writes an unset date as an empty value. Otherwise like WriteStringToFile. */
     static void WriteDateToFile(PropertyFile& file, const std::string& key, const DateTime& value);
 
     /**
-     * The CIM datetime text of a date: yyyymmddhhmmss.mmmmmmsutc, 25 characters, in the offset that
-     * the date carries. No date gives "00000000000000.000000-000".
+     * Converts a date to a CIM datetime string of 25 characters, yyyymmddhhmmss.mmmmmmsutc, in the date's offset. An
+     * unset date yields "00000000000000.000000-000".
      */
     static std::string convertCIMDateTime(DateTime value);
 
     /**
-     * The date that a CIM datetime text tells; no date when it is no valid one. An interval is no date.
-     * convertCIMDateTime() gives back exactly the text that a date was made from.
+     * Converts a CIM datetime string to a date; an unset date if the string is not valid or is an interval.
+     * convertCIMDateTime() returns the original string of a valid date.
      */
     static DateTime convertStringToDateTime(std::string text);
 };

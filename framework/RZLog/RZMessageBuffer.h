@@ -10,10 +10,10 @@
 namespace RZLog {
 
 /**
- * An output buffer in which one message after another is put together. It belongs to one thread.
+ * An output buffer for formatting consecutive messages. Belongs to one thread.
  *
- * Its stream starts each message like a new one, with the classic locale: formatting flags, errors and
- * exception masks do not reach the next message. Making a buffer is cheap; make one where it is needed.
+ * Each message starts with a reset stream in the classic locale: formatting flags, errors and exception masks do not
+ * affect the next message. Creating a buffer is cheap; use local variables.
  */
 class KO_EXPORT RZMessageBuffer {
 public:
@@ -22,15 +22,15 @@ public:
     RZMessageBuffer(const RZMessageBuffer&) = delete;
     RZMessageBuffer& operator=(const RZMessageBuffer&) = delete;
 
-    /** Appends text (null appends nothing). @return the stream view, for inserting more */
+    /** Appends a string; null appends nothing. @return the stream, for inserting more */
     std::ostream& operator<<(const char* text);
 
-    /** The stream view, for inserting values of any type; lives as long as the buffer. */
+    /** Returns the stream, for inserting values of any type. Valid as long as the buffer. */
     operator std::ostream&();
 
     /** @name Taking the message
-     * Gives the text accumulated since the last taking and leaves the buffer empty, ready for the
-     * next message. The argument is this buffer, or the stream that its operator<< returned.
+     * Returns the string that was inserted since the last call and clears the buffer for the next message. The argument
+     * is this buffer, or the stream that its operator<< returned.
      */
     ///@{
     std::string str(RZMessageBuffer& buffer);
@@ -43,8 +43,8 @@ private:
 };
 
 /**
- * Appends a value that is no C string as the stream view shows it: a string as its characters, any other pointer as its
- * address. An enumeration is appended as its number. @return the stream view, for inserting more
+ * Appends a value that is not a C string in its stream format: a std::string as its characters, a pointer as its
+ * address, an enumeration as its number. @return the stream, for inserting more
  */
 template <class Value, class = std::enable_if_t<!std::is_convertible_v<const Value&, const char*>>>
 std::ostream& operator<<(RZMessageBuffer& buffer, const Value& value) {
