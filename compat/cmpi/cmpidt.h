@@ -1,9 +1,9 @@
 /*
- * CMPI 2.0 data types: what values look like when they pass between an object manager (the broker)
- * and a provider. The functions that work on them are in cmpift.h, shorthand for them in cmpimacs.h.
+ * CMPI 2.0 data types: representation of values that an object manager (the broker) and a provider exchange. cmpift.h
+ * declares the functions, and cmpimacs.h macros for them.
  *
- * The header is C99 and C++. Sizes, values, member order and struct tags are those of the CMPI 2.0
- * standard on 64-bit Linux; a provider compiled against it runs under any broker of that standard.
+ * The header is valid C99 and C++. Sizes, values, member order and struct tags are those of the CMPI 2.0 standard on
+ * 64-bit Linux. A provider compiled with it runs in any broker that conforms to that standard.
  */
 #ifndef CMPIDT_H
 #define CMPIDT_H
@@ -17,7 +17,7 @@ extern "C" {
 #endif
 
 /** @name Versions
- * What the version members of function tables hold: the interface version times a hundred.
+ * Values of the version members of function tables: the interface version times a hundred.
  */
 ///@{
 #define CMPIVersion100 100
@@ -45,14 +45,14 @@ typedef float CMPIReal32;
 typedef double CMPIReal64;
 ///@}
 
-/** @name Scalars of the interface itself */
+/** @name Scalars of the interface */
 ///@{
-typedef unsigned int CMPICount;        /**< a number of elements, or a zero-based position */
+typedef unsigned int CMPICount;        /**< a number of elements, or a zero-based index */
 typedef unsigned int CMPIFlags;        /**< a set of CMPI_FLAG_ bits */
 typedef unsigned short CMPIType;       /**< one of the types below */
 typedef unsigned short CMPIValueState; /**< a set of the value states below */
 typedef void* CMPIMsgFileHandle;       /**< an open message catalogue of the broker */
-typedef void CMPIGcStat;               /**< a mark of the broker's memory, only ever pointed to */
+typedef void CMPIGcStat;               /**< a mark of the broker's memory, used only as a pointer */
 ///@}
 
 /* ---------------------------------------------------------------------------------------------- */
@@ -60,10 +60,10 @@ typedef void CMPIGcStat;               /**< a mark of the broker's memory, only 
 /* ---------------------------------------------------------------------------------------------- */
 
 /** @name Types of values
- * The type says which member of CMPIValue holds the value; its bits say what family it is of.
+ * The type determines the member of CMPIValue; its bits determine the family of types.
  */
 ///@{
-#define CMPI_null 0x0000 /**< no type: there is no value */
+#define CMPI_null 0x0000 /**< no type: no value */
 
 #define CMPI_SIMPLE 0x0002 /**< family of boolean and char16 */
 #define CMPI_boolean 0x0002
@@ -95,9 +95,9 @@ typedef void CMPIGcStat;               /**< a mark of the broker's memory, only 
 #define CMPI_filter 0x1400 /**< a select expression */
 #define CMPI_enumeration 0x1500
 #define CMPI_string 0x1600 /**< a string object of the broker */
-#define CMPI_chars 0x1700  /**< characters ended by a zero; their own address is passed where a value's is asked for */
+#define CMPI_chars 0x1700  /**< null-terminated characters; pass their address instead of that of a value */
 #define CMPI_dateTime 0x1800
-#define CMPI_ptr 0x1900      /**< bytes with a length, meaningful to provider and caller only */
+#define CMPI_ptr 0x1900      /**< bytes with a length, interpreted only by provider and caller */
 #define CMPI_charsptr 0x1a00 /**< a pointer to a character pointer */
 ///@}
 
@@ -126,7 +126,7 @@ typedef void CMPIGcStat;               /**< a mark of the broker's memory, only 
 ///@}
 
 /** @name Types of keys
- * Other names for the types a key of an object path usually has.
+ * Aliases of the usual types of object path keys.
  */
 ///@{
 #define CMPI_keyInteger CMPI_sint64
@@ -140,25 +140,25 @@ typedef void CMPIGcStat;               /**< a mark of the broker's memory, only 
 /* ---------------------------------------------------------------------------------------------- */
 
 /** @name States of values
- * Bits beside a value. Without a bit set it is good; with the null bit the value must not be read.
+ * A set of bits. 0 means a good value. If the null bit is set, do not read the value.
  */
 ///@{
 #define CMPI_goodValue ((CMPIValueState)0x0000)
 #define CMPI_nullValue ((CMPIValueState)0x0100) /**< typed, but without a value */
 #define CMPI_keyValue ((CMPIValueState)0x0200)  /**< the value is one of a key */
-#define CMPI_notFound ((CMPIValueState)0x0400)  /**< what was asked for does not exist */
+#define CMPI_notFound ((CMPIValueState)0x0400)  /**< the requested name does not exist */
 #define CMPI_badValue ((CMPIValueState)0x8000)  /**< the value is unusable */
 ///@}
 
-/** Bytes of any meaning: where they start and how many there are. */
+/** Uninterpreted bytes: address and length. */
 struct _CMPIValuePtr {
-    void* ptr;        /**< null: none */
+    void* ptr;        /**< null for none */
     CMPICount length; /**< in bytes */
 };
 
 /**
- * A value of any type. The type that stands beside it (in CMPIData, or as the next argument) names
- * the member to read. Pointers are borrowed: storing one here gives nothing away.
+ * A value of any type. The associated type (in CMPIData, or the next argument) determines the member. Pointers are
+ * borrowed: storing a pointer does not transfer ownership.
  */
 union _CMPIValue {
     CMPIUint64 uint64;
@@ -185,7 +185,7 @@ union _CMPIValue {
     CMPIDateTime* dateTime;
     CMPIValuePtr dataPtr;
 
-    /** @name The same integers and reals under the names of C types */
+    /** @name Members with names of C types */
     ///@{
     CMPISint8 Byte;
     CMPISint16 Short;
@@ -196,7 +196,7 @@ union _CMPIValue {
     ///@}
 };
 
-/** A value with its type and state: what every reading function answers. Look at the state first. */
+/** A value with its type and state: the result of every reading function. Check the state first. */
 struct _CMPIData {
     CMPIType type;
     CMPIValueState state;
@@ -204,9 +204,9 @@ struct _CMPIData {
 };
 
 /**
- * Reads a property by name, for the evaluation of a select expression without an instance.
- * @param name the property asked for
- * @param parameter what was handed to the evaluating function along with the accessor
+ * Reads a property by name, to evaluate a select expression without an instance.
+ * @param name name of the property
+ * @param parameter the argument of the evaluating function
  */
 typedef CMPIData CMPIAccessor(const char* name, void* parameter);
 
@@ -214,7 +214,7 @@ typedef CMPIData CMPIAccessor(const char* name, void* parameter);
 /* Status                                                                                          */
 /* ---------------------------------------------------------------------------------------------- */
 
-/** How an operation ended. 1 to 17 are the status codes that CIM clients see. */
+/** Result of an operation. 1 to 17 are the status codes of CIM operations. */
 typedef enum _CMPIrc {
     CMPI_RC_OK = 0,
     CMPI_RC_ERR_FAILED = 1,
@@ -234,29 +234,26 @@ typedef enum _CMPIrc {
     CMPI_RC_ERR_INVALID_QUERY = 15,
     CMPI_RC_ERR_METHOD_NOT_AVAILABLE = 16,
     CMPI_RC_ERR_METHOD_NOT_FOUND = 17,
-    CMPI_RC_DO_NOT_UNLOAD = 50,         /**< answer of a cleanup: not now, ask again */
-    CMPI_RC_NEVER_UNLOAD = 51,          /**< answer of a cleanup: keep the provider for good */
-    CMPI_RC_ERR_INVALID_HANDLE = 60,    /**< an object is not what the function expects, or is gone */
-    CMPI_RC_ERR_INVALID_DATA_TYPE = 61, /**< a type is not known, or is not allowed here */
-    CMPI_RC_ERROR_SYSTEM = 100,         /**< the operating system refused something */
-    CMPI_RC_ERROR = 200                 /**< the broker itself failed */
+    CMPI_RC_DO_NOT_UNLOAD = 50,         /**< result of a cleanup: not now, call again */
+    CMPI_RC_NEVER_UNLOAD = 51,          /**< result of a cleanup: never unload the provider */
+    CMPI_RC_ERR_INVALID_HANDLE = 60,    /**< an object has the wrong type or no longer exists */
+    CMPI_RC_ERR_INVALID_DATA_TYPE = 61, /**< a type is unknown or not allowed */
+    CMPI_RC_ERROR_SYSTEM = 100,         /**< the operating system reported an error */
+    CMPI_RC_ERROR = 200                 /**< the broker failed */
 } CMPIrc;
 
-/**
- * A code and, where there is more to say, a message; a null message says nothing more. Functions
- * that take a pointer to one fill both members, and take null from a caller who does not care.
- */
+/** A code and an optional message. Functions with a pointer parameter of this type set both members and accept null. */
 struct _CMPIStatus {
     CMPIrc rc;
     CMPIString* msg;
 };
 
 /* ---------------------------------------------------------------------------------------------- */
-/* What a broker can, and what a request asks                                                      */
+/* Capabilities of brokers and flags of requests                                                   */
 /* ---------------------------------------------------------------------------------------------- */
 
-/** @name What a broker supports
- * Bits of the broker's capabilities; each contains those it builds on.
+/** @name Broker capabilities
+ * Sets of bits; each contains the capabilities that it depends on.
  */
 ///@{
 #define CMPI_MB_BasicRead 0x0001
@@ -265,7 +262,7 @@ struct _CMPIStatus {
 #define CMPI_MB_AssociationTraversal 0x0009
 ///@}
 
-/** @name Classes of brokers */
+/** @name Broker classes */
 ///@{
 #define CMPI_MB_Class_0 0x0001
 #define CMPI_MB_Class_1 0x0003
@@ -273,7 +270,7 @@ struct _CMPIStatus {
 ///@}
 
 /** @name Invocation flags
- * What the client asked for, under the context entry CMPIInvocationFlags.
+ * Options of the client, in the context entry CMPIInvocationFlags.
  */
 ///@{
 #define CMPI_FLAG_LocalOnly 0x0001
@@ -286,17 +283,17 @@ struct _CMPIStatus {
 ///@{
 #define CMPIInitNameSpace "CMPIInitNameSpace"     /**< string: the namespace of the provider's registration */
 #define CMPIInvocationFlags "CMPIInvocationFlags" /**< uint32: CMPI_FLAG_ bits */
-#define CMPIPrincipal "CMPIPrincipal"             /**< string: who is asking */
-#define CMPIRole "CMPIRole"                       /**< string: in what role */
-#define CMPIAcceptLanguage "CMPIAcceptLanguage"   /**< string: the languages the client prefers */
-#define CMPIContentLanguage "CMPIContentLanguage" /**< string: the language of what the client sent */
+#define CMPIPrincipal "CMPIPrincipal"             /**< string: the user */
+#define CMPIRole "CMPIRole"                       /**< string: the user's role */
+#define CMPIAcceptLanguage "CMPIAcceptLanguage"   /**< string: the client's preferred languages */
+#define CMPIContentLanguage "CMPIContentLanguage" /**< string: the language of the client's data */
 ///@}
 
 /* ---------------------------------------------------------------------------------------------- */
 /* Enumerations of single functions                                                                */
 /* ---------------------------------------------------------------------------------------------- */
 
-/** What a predicate compares, or how it joins others. */
+/** Operator of a predicate. */
 typedef enum _CMPIPredOp {
     CMPI_PredOp_Equals = 1,
     CMPI_PredOp_NotEquals = 2,
@@ -314,27 +311,27 @@ typedef enum _CMPIPredOp {
     CMPI_PredOp_Or = 14
 } CMPIPredOp;
 
-/** How the sub-conditions of a condition are joined. */
+/** Type of a condition. */
 typedef enum _CMPISelectCondType {
     CMPI_COND_DOC = 0, /**< a disjunction of conjunctions */
     CMPI_COND_COD = 1  /**< a conjunction of disjunctions */
 } CMPISelectCondType;
 
-/** How grave a message for the broker's log is. */
+/** Severity of a message in the broker's log. */
 typedef enum _CMPISeverity {
     CMPI_SEV_ERROR = 1,
     CMPI_SEV_INFO = 2,
     CMPI_SEV_WARNING = 3,
-    CMPI_DEV_DEBUG = 4 /**< of interest to developers only */
+    CMPI_DEV_DEBUG = 4 /**< for developers only */
 } CMPISeverity;
 
-/** How detailed a message for the broker's trace is. */
+/** Level of a message in the broker's trace. */
 typedef enum _CMPILevel { CMPI_LEV_INFO = 1, CMPI_LEV_WARNING = 2, CMPI_LEV_VERBOSE = 3 } CMPILevel;
 
-/** Where an error comes from, as the CIM schema counts it. */
+/** Type of an error, as defined by the CIM schema. */
 typedef enum _CMPIErrorType {
     UnknownErrorType = 0,
-    OtherErrorType = 1, /**< the error object names it in words */
+    OtherErrorType = 1, /**< described in the error object */
     CommunicationsError = 2,
     QualityOfServiceError = 3,
     SoftwareError = 4,
@@ -346,7 +343,7 @@ typedef enum _CMPIErrorType {
     UnsupportedOperationError = 10
 } CMPIErrorType;
 
-/** How grave an error is to whoever reports it. */
+/** Severity of an error for the object that reports it. */
 typedef enum _CMPIErrorSeverity {
     ErrorSevUnknown = 0,
     ErrorSevLow = 2,
@@ -356,20 +353,20 @@ typedef enum _CMPIErrorSeverity {
 } CMPIErrorSeverity;
 
 /**
- * The probable cause of an error. The values are those of the CIM schema's ProbableCause, 0 to 130;
- * those without a name here are used by their number.
+ * Probable cause of an error. The values are those of the CIM schema's ProbableCause, 0 to 130; use the number for
+ * causes without a name.
  */
 typedef enum _CMPIErrorProbableCause {
     ErrorProbCauseUnknown = 0,
-    ErrorProbCauseOther = 1, /**< the error object describes it */
+    ErrorProbCauseOther = 1, /**< described in the error object */
     Unexpected_Information = 130
 } CMPIErrorProbableCause;
 
-/** How the source of an error is written. */
+/** Format of the source of an error. */
 typedef enum _CMPIErrorSrcFormat {
     CMPIErrSrcUnknown = 0,
-    CMPIErrSrcOther = 1, /**< the error object names the format */
-    CIMObjectHandle = 2  /**< as an object path */
+    CMPIErrSrcOther = 1, /**< described in the error object */
+    CIMObjectHandle = 2  /**< an object path */
 } CMPIErrorSrcFormat;
 
 #ifdef __cplusplus

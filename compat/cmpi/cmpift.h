@@ -1,23 +1,21 @@
 /*
- * CMPI 2.0 function tables: everything a provider can call, and everything it has to offer.
+ * CMPI 2.0 function tables: the functions that a provider can call and those that it implements.
  *
- * Every object of the interface is a pair of a private handle, which belongs to whoever made the
- * object, and a pointer to a table of functions. Slots, order and signatures are those of the
- * CMPI 2.0 standard. What holds for all tables and is not repeated at each function:
+ * Every object is a pair of a private handle, which belongs to the object's creator, and a pointer to a function table.
+ * Slots, order and signatures are those of the CMPI 2.0 standard. Rules for all tables:
  *
- * - The first argument is the object that the function was taken from. It must not be null.
- * - ftVersion tells which version of the table this is; later versions only add functions at its
- *   end. Where a broker does not support a function, its pointer may be null.
- * - `rc` receives how the call ended; null when the caller does not want to know.
- * - When a call fails, it answers null, 0 or a value in the state null, whichever its type allows.
- * - What a call answers belongs to the broker and lives until the request ends. Nobody has to, and
- *   a provider should not, release it. Exceptions say so.
- * - Text and values handed in are copied; the caller keeps them.
- * - A property list is an array of names ended by a null pointer; a null list means all properties.
- * - An optional text that does not restrict anything is null.
- * - release ends the life of an object early; it is meant for objects that clone made.
- * - clone copies an object with all it contains. The copy outlives the request: whoever asked for
- *   it has to release it.
+ * - The first argument is the object whose table contains the function. It must not be null.
+ * - ftVersion is the version of the table; later versions only append functions. If a broker does not support a
+ *   function, its pointer may be null.
+ * - `rc` receives the status of the call; it may be null.
+ * - A failed call returns null, 0 or a value in the null state, depending on its type.
+ * - A returned object belongs to the broker and is valid until the request ends. Callers should not release it, unless
+ *   documented otherwise.
+ * - String and value arguments are copied; the caller keeps ownership.
+ * - A property list is a null-terminated array of names; a null list means all properties.
+ * - An optional string argument that does not restrict the results is null.
+ * - release destroys an object early; it is meant for clones.
+ * - clone makes a deep copy that outlives the request. The caller must release it.
  */
 #ifndef CMPIFT_H
 #define CMPIFT_H

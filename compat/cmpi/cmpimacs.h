@@ -1,11 +1,10 @@
 /*
- * Shorthand for providers: the functions of the CMPI 2.0 tables under the names of the standard, and
- * stubs that make a provider's tables and factories out of its functions.
+ * Macros for providers: the functions of the CMPI 2.0 tables under the names of the standard, and stubs that define a
+ * provider's tables and factories.
  *
- * A macro calls one function of the object that is its first argument (of the broker, in the macros
- * that take one) and answers what that function answers; cmpift.h and the headers it includes say
- * what that is. The first argument is evaluated more than once: it should be a name. Where a value is
- * taken, any pointer to one will do, also a pointer to characters for the type CMPI_chars.
+ * A macro calls a function of its first argument (an object, or the broker) and returns the function's result; see
+ * cmpift.h and its includes. The first argument is evaluated more than once, so pass a name. A value parameter accepts
+ * any pointer to a value, including a pointer to characters for the type CMPI_chars.
  */
 #ifndef CMPIMACS_H
 #define CMPIMACS_H
@@ -15,12 +14,12 @@
 #include "cmpift.h"
 
 /* ---------------------------------------------------------------------------------------------- */
-/* Ends of functions                                                                               */
+/* Returning from functions                                                                        */
 /* ---------------------------------------------------------------------------------------------- */
 
-/** @name Answers of a provider's operation
- * Statements that return from a function whose result is a CMPIStatus: with a code alone, with a
- * message in a CMPIString, or with one in characters, which the broker makes a string of.
+/** @name Results of a provider's operation
+ * Statements that return from a function with the result CMPIStatus: a code alone, or with a message in a CMPIString or
+ * in characters, which are converted to a CMPIString.
  */
 ///@{
 #define CMReturn(code)                                     \
@@ -40,8 +39,8 @@
     } while (0)
 ///@}
 
-/** @name Filling a status
- * Statements that set both members of a status; the status is given by a pointer that may be null.
+/** @name Setting a status
+ * Statements that set both members of a status, given by a pointer that may be null.
  */
 ///@{
 #define CMSetStatusWithString(status, code, string) \
@@ -58,26 +57,26 @@
 ///@}
 
 /* ---------------------------------------------------------------------------------------------- */
-/* Questions about any object or value                                                             */
+/* Queries about any object or value                                                               */
 /* ---------------------------------------------------------------------------------------------- */
 
-/** Whether there is no object, or one that is not usable any more. */
+/** Whether an object is null or no longer usable. */
 #define CMIsNullObject(object) ((object) == NULL || (object)->hdl == NULL)
 
-/** @name Questions about a CMPIData */
+/** @name Queries about a CMPIData */
 ///@{
 #define CMIsNullValue(data) (((data).state & CMPI_nullValue) != 0)
 #define CMIsKeyValue(data) (((data).state & CMPI_keyValue) != 0)
 #define CMIsArray(data) (((data).type & CMPI_ARRAY) != 0)
 ///@}
 
-/** @name Life of any encapsulated object */
+/** @name Lifetime of any encapsulated object */
 ///@{
 #define CMRelease(object) ((object)->ft->release((object)))
 #define CMClone(object, rc) ((object)->ft->clone((object), (rc)))
 ///@}
 
-/** @name What the broker knows of an object */
+/** @name Information about objects */
 ///@{
 #define CDToString(broker, object, rc) ((broker)->eft->toString((broker), (object), (rc)))
 #define CDIsOfType(broker, object, type, rc) ((broker)->eft->isOfType((broker), (object), (type), (rc)))
@@ -86,7 +85,7 @@
 ///@}
 
 /* ---------------------------------------------------------------------------------------------- */
-/* Makers                                                                                          */
+/* Creation of objects                                                                             */
 /* ---------------------------------------------------------------------------------------------- */
 
 #define CMNewInstance(broker, path, rc) ((broker)->eft->newInstance((broker), (path), (rc)))
@@ -184,7 +183,7 @@
 ///@}
 
 /** @name CMPIString
- * The characters, ended by a zero; they may be null.
+ * The null-terminated characters; they may be null.
  */
 ///@{
 #define CMGetCharsPtr(string, rc) ((string)->ft->getCharPtr((string), (rc)))
@@ -228,7 +227,7 @@
 #define CMGetCod(expression, rc) ((expression)->ft->getCOD((expression), (rc)))
 ///@}
 
-/** @name Its conditions and predicates */
+/** @name Conditions and predicates */
 ///@{
 #define CMGetSubCondCountAndType(condition, type, rc) ((condition)->ft->getCountAndType((condition), (type), (rc)))
 #define CMGetSubCondAt(condition, index, rc) ((condition)->ft->getSubCondAt((condition), (index), (rc)))

@@ -1,6 +1,6 @@
 /*
- * The broker: what an object manager offers its providers. Included by cmpift.h, which states what
- * holds for all tables.
+ * The broker: functions of the object manager that providers call. Included by cmpift.h, which documents the rules for
+ * all tables.
  */
 #ifndef CMPI20_BROKER_H
 #define CMPI20_BROKER_H
@@ -14,86 +14,92 @@
 extern "C" {
 #endif
 
-/* Strict C99 leaves it out of time.h. */
+/* time.h does not declare it in strict C99 mode. */
 struct timespec;
 
-/** The object manager. It outlives the providers that it loads; they keep the pointer, nothing else. */
+/** The object manager. It outlives its providers, which keep only this pointer. */
 struct _CMPIBroker {
     void* hdl;
     CMPIBrokerFT* bft;    /**< services: threads of a request, indications, operations on other classes */
-    CMPIBrokerEncFT* eft; /**< makers and helpers of encapsulated objects */
+    CMPIBrokerEncFT* eft; /**< functions that create and examine encapsulated objects */
     CMPIBrokerExtFT* xft; /**< threads, mutexes and conditions of the operating system; may be null */
     CMPIBrokerMemFT* mft; /**< memory; may be null */
 };
 
 /**
- * Services of the broker. The operations on instances and associations are those of a CIM client;
- * the broker routes them to the provider that serves the class, which may be the caller itself and
- * may run on another thread: no lock may be held across them.
+ * Services of the broker. The operations on instances and associations are those of a CIM client. The broker calls the
+ * provider that serves the class, possibly the caller itself and possibly on another thread, so callers must not hold a
+ * lock.
  */
 struct _CMPIBrokerFT {
     unsigned int brokerCapabilities; /**< CMPI_MB_ bits */
-    unsigned int brokerVersion;      /**< the CMPI version it offers */
+    unsigned int brokerVersion;      /**< CMPI version of the broker */
     const char* brokerName;
 
-    /** @name Threads that a provider starts itself */
+    /** @name Threads that a provider starts */
     ///@{
 
-    /** A context for a new thread, made by the thread that starts it and passed to attachThread. */
+    /**
+     * Creates a context for a new thread. The starting thread calls this and the new thread passes the context to
+     * attachThread.
+     */
     CMPIContext* (*prepareAttachThread)(const CMPIBroker* broker, const CMPIContext* context);
-    /** Makes the calling thread known to the broker; it may call the broker from here on. */
+    /** Registers the calling thread with the broker, so that the thread can call the broker. */
     CMPIStatus (*attachThread)(const CMPIBroker* broker, const CMPIContext* context);
-    /** Ends what attachThread began, and the life of the thread's context. */
+    /** Reverses attachThread and releases the thread's context. */
     CMPIStatus (*detachThread)(const CMPIBroker* broker, const CMPIContext* context);
     ///@}
 
-    /** Hands an indication to everybody who subscribed to it in the namespace. */
+    /** Delivers an indication to all its subscribers in the namespace. */
     CMPIStatus (*deliverIndication)(const CMPIBroker* broker, const CMPIContext* context, const char* nameSpace,
                                     const CMPIInstance* indication);
 
     /** @name Operations on instances */
     ///@{
 
-    /** The object paths of the instances of a class, given by a path without keys. */
+    /** Returns the object paths of the instances of a class, given by a path without keys. */
     CMPIEnumeration* (*enumerateInstanceNames)(const CMPIBroker* broker, const CMPIContext* context,
                                                const CMPIObjectPath* classPath, CMPIStatus* rc);
-    /** The instance that a path names. */
+    /** Returns the instance with the path. */
     CMPIInstance* (*getInstance)(const CMPIBroker* broker, const CMPIContext* context, const CMPIObjectPath* path,
                                  const char** properties, CMPIStatus* rc);
-    /** Creates an instance; answers the path by which it was created. */
+    /** Creates an instance and returns its path. */
     CMPIObjectPath* (*createInstance)(const CMPIBroker* broker, const CMPIContext* context, const CMPIObjectPath* path,
                                       const CMPIInstance* instance, CMPIStatus* rc);
-    /** Sets the listed properties of an instance to those of another; a listed one that is not there becomes null. */
+    /**
+     * Sets the listed properties of an instance to those of another. A listed property that the other lacks becomes
+     * null.
+     */
     CMPIStatus (*modifyInstance)(const CMPIBroker* broker, const CMPIContext* context, const CMPIObjectPath* path,
                                  const CMPIInstance* instance, const char** properties);
     /** Deletes an instance. */
     CMPIStatus (*deleteInstance)(const CMPIBroker* broker, const CMPIContext* context, const CMPIObjectPath* path);
-    /** The instances that a query in a language selects, among those of the path's class. */
+    /** Returns the instances of the path's class that a query selects. */
     CMPIEnumeration* (*execQuery)(const CMPIBroker* broker, const CMPIContext* context, const CMPIObjectPath* classPath,
                                   const char* query, const char* language, CMPIStatus* rc);
-    /** The instances of a class. */
+    /** Returns the instances of a class. */
     CMPIEnumeration* (*enumerateInstances)(const CMPIBroker* broker, const CMPIContext* context,
                                            const CMPIObjectPath* classPath, const char** properties, CMPIStatus* rc);
     ///@}
 
     /** @name Operations on associations
-     * The path is where they start. assocClass restricts the association, resultClass the far end;
-     * role is the near end's property in the association, resultRole the far end's.
+     * The path is the source. assocClass restricts the association class, resultClass the class of the targets, role
+     * the source's property in the association, and resultRole the target's property.
      */
     ///@{
 
-    /** The instances at the far ends. */
+    /** Returns the associated instances. */
     CMPIEnumeration* (*associators)(const CMPIBroker* broker, const CMPIContext* context, const CMPIObjectPath* path,
                                     const char* assocClass, const char* resultClass, const char* role,
                                     const char* resultRole, const char** properties, CMPIStatus* rc);
-    /** The object paths of the far ends. */
+    /** Returns the object paths of the associated instances. */
     CMPIEnumeration* (*associatorNames)(const CMPIBroker* broker, const CMPIContext* context,
                                         const CMPIObjectPath* path, const char* assocClass, const char* resultClass,
                                         const char* role, const char* resultRole, CMPIStatus* rc);
-    /** The association instances themselves; resultClass is their class. */
+    /** Returns the association instances; resultClass is their class. */
     CMPIEnumeration* (*references)(const CMPIBroker* broker, const CMPIContext* context, const CMPIObjectPath* path,
                                    const char* resultClass, const char* role, const char** properties, CMPIStatus* rc);
-    /** The object paths of the association instances. */
+    /** Returns the object paths of the association instances. */
     CMPIEnumeration* (*referenceNames)(const CMPIBroker* broker, const CMPIContext* context, const CMPIObjectPath* path,
                                        const char* resultClass, const char* role, CMPIStatus* rc);
     ///@}
@@ -101,61 +107,61 @@ struct _CMPIBrokerFT {
     /** @name Methods and single properties */
     ///@{
 
-    /** Invokes a method of an instance or, on a path without keys, of a class; fills `out`. */
+    /** Calls a method of an instance or, with a path without keys, of a class. Writes the output arguments to `out`. */
     CMPIData (*invokeMethod)(const CMPIBroker* broker, const CMPIContext* context, const CMPIObjectPath* path,
                              const char* method, const CMPIArgs* in, CMPIArgs* out, CMPIStatus* rc);
-    /** Sets one property of an instance; a null value makes it null. */
+    /** Sets a property of an instance. A null value sets the property to null. */
     CMPIStatus (*setProperty)(const CMPIBroker* broker, const CMPIContext* context, const CMPIObjectPath* path,
                               const char* name, const CMPIValue* value, CMPIType type);
-    /** One property of an instance. */
+    /** Returns a property of an instance. */
     CMPIData (*getProperty)(const CMPIBroker* broker, const CMPIContext* context, const CMPIObjectPath* path,
                             const char* name, CMPIStatus* rc);
     ///@}
 };
 
-/** Makers of encapsulated objects, and what can be asked about any of them. */
+/** Functions that create encapsulated objects or return information about them. */
 struct _CMPIBrokerEncFT {
     int ftVersion;
 
-    /** @name Makers */
+    /** @name Creating objects */
     ///@{
 
-    /** An instance of a path's class, with that path. */
+    /** Creates an instance of the path's class with that path. */
     CMPIInstance* (*newInstance)(const CMPIBroker* broker, const CMPIObjectPath* path, CMPIStatus* rc);
-    /** A path of a class, without keys. */
+    /** Creates a path of a class, without keys. */
     CMPIObjectPath* (*newObjectPath)(const CMPIBroker* broker, const char* nameSpace, const char* className,
                                      CMPIStatus* rc);
-    /** An empty list of method arguments. */
+    /** Creates an empty list of method arguments. */
     CMPIArgs* (*newArgs)(const CMPIBroker* broker, CMPIStatus* rc);
-    /** A string; null text makes one whose characters are null. */
+    /** Creates a string. Null text creates a string with null characters. */
     CMPIString* (*newString)(const CMPIBroker* broker, const char* text, CMPIStatus* rc);
-    /** An array of `size` null elements; `type` is the type of an element. */
+    /** Creates an array of `size` null elements; `type` is the type of an element. */
     CMPIArray* (*newArray)(const CMPIBroker* broker, CMPICount size, CMPIType type, CMPIStatus* rc);
-    /** The current time. */
+    /** Returns the current time. */
     CMPIDateTime* (*newDateTime)(const CMPIBroker* broker, CMPIStatus* rc);
-    /** Microseconds since 1970-01-01 UTC or, of an interval, microseconds. */
+    /** Creates a datetime from microseconds since 1970-01-01 UTC, or an interval from microseconds. */
     CMPIDateTime* (*newDateTimeFromBinary)(const CMPIBroker* broker, CMPIUint64 microseconds, CMPIBoolean interval,
                                            CMPIStatus* rc);
-    /** From the 25 characters of CIM's text form of a datetime or interval. */
+    /** Creates a datetime or interval from its 25-character CIM string. */
     CMPIDateTime* (*newDateTimeFromChars)(const CMPIBroker* broker, const char* text, CMPIStatus* rc);
-    /** A parsed query; `projection`, unless null, receives the names it selects. */
+    /** Parses a query; `projection`, unless null, receives the selected names. */
     CMPISelectExp* (*newSelectExp)(const CMPIBroker* broker, const char* query, const char* language,
                                    CMPIArray** projection, CMPIStatus* rc);
     ///@}
 
-    /** @name Questions about objects
-     * An object is any encapsulated one: the broker knows its kind by its function table.
+    /** @name Information about objects
+     * The object may be any encapsulated object: the broker identifies its type by its function table.
      */
     ///@{
 
-    /** Whether a path's class is a class or a subclass of it. */
+    /** Returns whether a path's class is the class or one of its subclasses. */
     CMPIBoolean (*classPathIsA)(const CMPIBroker* broker, const CMPIObjectPath* path, const char* className,
                                 CMPIStatus* rc);
-    /** A text for people that shows what is in an object; its form is the broker's. */
+    /** Returns a human-readable description of an object in a format of the broker. */
     CMPIString* (*toString)(const CMPIBroker* broker, const void* object, CMPIStatus* rc);
-    /** Whether an object is of the interface type of that name, such as "CMPIInstance". */
+    /** Returns whether an object has the interface type with that name, such as "CMPIInstance". */
     CMPIBoolean (*isOfType)(const CMPIBroker* broker, const void* object, const char* type, CMPIStatus* rc);
-    /** The name of an object's interface type. */
+    /** Returns the name of an object's interface type. */
     CMPIString* (*getType)(const CMPIBroker* broker, const void* object, CMPIStatus* rc);
     ///@}
 
@@ -163,15 +169,15 @@ struct _CMPIBrokerEncFT {
     ///@{
 
     /**
-     * A message in the client's language, with its place holders filled.
-     * @param count number of arguments that follow, each a CMPIType and a value of it
+     * Returns a message in the client's language with its placeholders replaced.
+     * @param count number of arguments that follow, each a CMPIType and a value of that type
      */
     CMPIString* (*getMessage)(const CMPIBroker* broker, const char* id, const char* defaultText, CMPIStatus* rc,
                               CMPICount count, ...);
-    /** Writes to the broker's log: `text` or, when that is null, `string`. */
+    /** Writes `text` to the broker's log or, if `text` is null, `string`. */
     CMPIStatus (*logMessage)(const CMPIBroker* broker, int severity, const char* id, const char* text,
                              const CMPIString* string);
-    /** Writes to the broker's trace, likewise. */
+    /** Writes to the broker's trace. Otherwise like logMessage. */
     CMPIStatus (*trace)(const CMPIBroker* broker, int level, const char* component, const char* text,
                         const CMPIString* string);
     ///@}
@@ -179,56 +185,55 @@ struct _CMPIBrokerEncFT {
     /** @name Since CMPI 2.0 */
     ///@{
 
-    /** An error object, for CMPIResultFT's returnError. */
+    /** Creates an error object for CMPIResultFT's returnError. */
     CMPIError* (*newCMPIError)(const CMPIBroker* broker, const char* owningEntity, const char* messageId,
                                const char* message, const CMPIErrorSeverity severity,
                                const CMPIErrorProbableCause probableCause, const CMPIrc statusCode, CMPIStatus* rc);
-    /** Opens a message catalogue; the caller closes it. */
+    /** Opens a message catalogue. The caller must close it. */
     CMPIStatus (*openMessageFile)(const CMPIBroker* broker, const char* name, CMPIMsgFileHandle* file);
     /** Closes a message catalogue. */
     CMPIStatus (*closeMessageFile)(const CMPIBroker* broker, const CMPIMsgFileHandle file);
-    /** As getMessage, from an open message catalogue. */
+    /** Like getMessage, with a message from an open message catalogue. */
     CMPIString* (*getMessage2)(const CMPIBroker* broker, const char* id, const CMPIMsgFileHandle file,
                                const char* defaultText, CMPIStatus* rc, CMPICount count, ...);
     ///@}
 };
 
 /**
- * The operating system's threads behind names that are the same everywhere. Functions that answer an
- * int answer 0 for success and an error number otherwise, those that make something null when they
- * cannot. What is made here belongs to the caller, who also ends it.
+ * Portable functions for threads of the operating system. A function that returns int returns 0 or an error number. A
+ * function that creates something returns null on failure. The caller owns the created objects and must destroy them.
  */
 struct _CMPIBrokerExtFT {
     int ftVersion;
 
-    /** The file of the library with that bare name, as the platform writes it; the caller frees it. */
+    /** Returns the platform's file name of the library. The caller must free it. */
     char* (*resolveFileName)(const char* libraryName);
 
     /** @name Threads */
     ///@{
 
-    /** Starts a thread; a detached one is not joined. */
+    /** Starts a thread. A detached thread cannot be joined. */
     void* (*newThread)(void* (*start)(void*), void* argument, int detached);
-    /** Waits for a thread; `result`, unless null, receives what it ended with. */
+    /** Waits for a thread; `result`, unless null, receives the thread's result. */
     int (*joinThread)(void* thread, void** result);
     /** Ends the calling thread. */
     int (*exitThread)(void* result);
-    /** Asks a thread to end. */
+    /** Requests the cancellation of a thread. */
     int (*cancelThread)(void* thread);
-    /** Lets the calling thread sleep. */
+    /** Suspends the calling thread. */
     int (*threadSleep)(CMPIUint32 milliseconds);
-    /** Calls `function` if it is the first call for this `once`, which starts as 0. */
+    /** Calls `function` on the first call for this `once`, whose initial value is 0. */
     int (*threadOnce)(int* once, void (*function)(void));
     ///@}
 
-    /** @name Values of a thread of its own */
+    /** @name Thread-specific values */
     ///@{
 
-    /** Makes a key; `cleanup`, unless null, is called with a thread's value when the thread ends. */
+    /** Creates a key. When a thread ends, `cleanup`, unless null, is called with its value. */
     int (*createThreadKey)(unsigned long* key, void (*cleanup)(void*));
-    /** Gives a key up, without cleaning up any value. */
+    /** Destroys a key without calling `cleanup`. */
     int (*destroyThreadKey)(unsigned long key);
-    /** The calling thread's value of a key; null when it has none. */
+    /** Returns the calling thread's value of a key; null if it has none. */
     void* (*getThreadSpecific)(unsigned long key);
     /** Sets the calling thread's value of a key. */
     int (*setThreadSpecific)(unsigned long key, void* value);
@@ -242,33 +247,33 @@ struct _CMPIBrokerExtFT {
     void (*unlockMutex)(void* mutex);
     void* (*newCondition)(int options);
     void (*destroyCondition)(void* condition);
-    /** Waits for a condition; the mutex is the caller's, and is released while it waits. */
+    /** Waits for a condition and releases the caller's mutex while waiting. */
     int (*condWait)(void* condition, void* mutex);
-    /** Waits for a condition until a point in time at most. */
+    /** Like condWait, with a timeout. */
     int (*timedCondWait)(void* condition, void* mutex, struct timespec* until);
-    /** Wakes who waits for a condition. */
+    /** Wakes a thread that waits for the condition. */
     int (*signalCondition)(void* condition);
     ///@}
 };
 
-/** Memory of the broker, and the release of single objects before the request ends. */
+/** Memory of the broker, and release of single objects before the request ends. */
 struct _CMPIBrokerMemFT {
     const int ftVersion;
 
     /** @name Marks
-     * For a thread that makes many objects in one request.
+     * For a thread that creates many objects in one request.
      */
     ///@{
 
-    /** Remembers which objects the thread has made so far. */
+    /** Returns a mark for the objects that the thread has created so far. */
     CMPIGcStat* (*mark)(const CMPIBroker* broker, CMPIStatus* rc);
-    /** Releases what the thread has made since a mark. */
+    /** Releases the objects that the thread has created since a mark. */
     CMPIStatus (*release)(const CMPIBroker* broker, const CMPIGcStat* mark);
     ///@}
 
     /** @name Allocation
-     * As the C functions of these names, but freed by the broker when the request ends, unless it
-     * was freed here before. Null when there is no memory.
+     * Like the C functions of these names, but the broker frees the memory at the end of the request if it was not
+     * freed before. Null if out of memory.
      */
     ///@{
     void* (*cmpiMalloc)(const CMPIBroker* broker, size_t size);
@@ -278,7 +283,7 @@ struct _CMPIBrokerMemFT {
     void (*cmpiFree)(const CMPIBroker* broker, void* memory);
     ///@}
 
-    /** @name Release of objects that the makers of CMPIBrokerEncFT made */
+    /** @name Release of objects that functions of CMPIBrokerEncFT created */
     ///@{
     void (*freeInstance)(const CMPIBroker* broker, CMPIInstance* instance);
     void (*freeObjectPath)(const CMPIBroker* broker, CMPIObjectPath* path);

@@ -1,22 +1,20 @@
 /*
- * Management interfaces: what a provider offers, one table a kind of operation. Included by cmpift.h.
+ * Management interfaces: the functions of a provider, one table per kind of operation. Included by cmpift.h.
  *
- * A provider's library exports one factory an interface that it offers, with C linkage:
- * NAME_Create_InstanceMI, NAME_Create_AssociationMI and so on, where NAME is the provider's name in
- * its registration. A factory is given the broker, a context and a status, and answers the interface,
- * which is the provider's own and stays valid until its cleanup; or null, with the reason in the
- * status.
+ * A provider's library exports one factory per interface, with C linkage: NAME_Create_InstanceMI,
+ * NAME_Create_AssociationMI and so on, where NAME is the provider's name in its registration. A factory receives the
+ * broker, a context and a status. It returns the interface, which the provider owns and which is valid until its
+ * cleanup. On failure it returns null and writes the reason to the status.
  *
- * What holds for all tables here:
- * - The operations are called on any thread, and on several at once.
- * - Context, result, object path, instance and texts belong to the caller; they are borrowed for the
- *   call.
- * - What an operation answers goes into the result; the status says only how it ended.
- * - An operation that a provider does not support answers CMPI_RC_ERR_NOT_SUPPORTED; no slot is null.
- * - miVersion is the version of the interface that the provider was written for, miName its name.
- * - cleanup is called before the provider is unloaded. `terminating` is true when the broker itself
- *   ends; otherwise the provider can refuse with CMPI_RC_DO_NOT_UNLOAD or CMPI_RC_NEVER_UNLOAD.
- * - The names of classes and roles, and the property list, restrict the answer; null does not.
+ * Rules for all tables:
+ * - The operations may be called on any thread, and concurrently.
+ * - Context, result, object path, instance and strings belong to the caller. They are borrowed for the call.
+ * - An operation writes its results to the result object and returns only a status.
+ * - An operation that a provider does not support returns CMPI_RC_ERR_NOT_SUPPORTED; no slot is null.
+ * - miVersion is the interface version that the provider was written for, miName the name of the interface.
+ * - cleanup is called before the provider is unloaded. `terminating` is true if the broker itself ends; otherwise the
+ *   provider can refuse with CMPI_RC_DO_NOT_UNLOAD or CMPI_RC_NEVER_UNLOAD.
+ * - The names of classes and roles, and the property list, restrict the results. A null pointer does not restrict them.
  */
 #ifndef CMPI20_INTERFACES_H
 #define CMPI20_INTERFACES_H
@@ -27,9 +25,9 @@
 extern "C" {
 #endif
 
-/** Instances of a class. */
+/** Instance operations of a class. */
 struct _CMPIInstanceMI {
-    const void* hdl; /**< the provider's own, as in the interfaces below; may be null */
+    const void* hdl; /**< owned by the provider, as in the interfaces below; may be null */
     CMPIInstanceMIFT* ft;
 };
 
@@ -45,24 +43,24 @@ struct _CMPIInstanceMIFT {
     /** Returns all instances of the path's class. */
     CMPIStatus (*enumerateInstances)(CMPIInstanceMI* mi, const CMPIContext* context, const CMPIResult* result,
                                      const CMPIObjectPath* classPath, const char** properties);
-    /** Returns the instance that the path names; CMPI_RC_ERR_NOT_FOUND when there is none. */
+    /** Returns the instance with the path, or CMPI_RC_ERR_NOT_FOUND. */
     CMPIStatus (*getInstance)(CMPIInstanceMI* mi, const CMPIContext* context, const CMPIResult* result,
                               const CMPIObjectPath* path, const char** properties);
     /** Creates an instance and returns its object path. */
     CMPIStatus (*createInstance)(CMPIInstanceMI* mi, const CMPIContext* context, const CMPIResult* result,
                                  const CMPIObjectPath* path, const CMPIInstance* instance);
-    /** Changes the listed properties of the instance that the path names to those given. */
+    /** Sets the listed properties of the instance with the path. */
     CMPIStatus (*modifyInstance)(CMPIInstanceMI* mi, const CMPIContext* context, const CMPIResult* result,
                                  const CMPIObjectPath* path, const CMPIInstance* instance, const char** properties);
-    /** Deletes the instance that the path names. */
+    /** Deletes the instance with the path. */
     CMPIStatus (*deleteInstance)(CMPIInstanceMI* mi, const CMPIContext* context, const CMPIResult* result,
                                  const CMPIObjectPath* path);
-    /** Returns the instances of the path's class that a query in a language selects. */
+    /** Returns the instances of the path's class that a query selects. */
     CMPIStatus (*execQuery)(CMPIInstanceMI* mi, const CMPIContext* context, const CMPIResult* result,
                             const CMPIObjectPath* classPath, const char* query, const char* language);
 };
 
-/** Associations of a class with others. The path is where they start. */
+/** Association operations. The path is the source. */
 struct _CMPIAssociationMI {
     void* hdl;
     CMPIAssociationMIFT* ft;
@@ -74,11 +72,11 @@ struct _CMPIAssociationMIFT {
     const char* miName;
     CMPIStatus (*cleanup)(CMPIAssociationMI* mi, const CMPIContext* context, CMPIBoolean terminating);
 
-    /** Returns the instances at the far ends. */
+    /** Returns the associated instances. */
     CMPIStatus (*associators)(CMPIAssociationMI* mi, const CMPIContext* context, const CMPIResult* result,
                               const CMPIObjectPath* path, const char* assocClass, const char* resultClass,
                               const char* role, const char* resultRole, const char** properties);
-    /** Returns the object paths of the far ends. */
+    /** Returns the object paths of the associated instances. */
     CMPIStatus (*associatorNames)(CMPIAssociationMI* mi, const CMPIContext* context, const CMPIResult* result,
                                   const CMPIObjectPath* path, const char* assocClass, const char* resultClass,
                                   const char* role, const char* resultRole);
@@ -103,7 +101,7 @@ struct _CMPIMethodMIFT {
     const char* miName;
     CMPIStatus (*cleanup)(CMPIMethodMI* mi, const CMPIContext* context, CMPIBoolean terminating);
 
-    /** Runs a method; adds its output to `out` and returns what it answers as data. */
+    /** Calls a method. Adds its output arguments to `out` and returns its result as data. */
     CMPIStatus (*invokeMethod)(CMPIMethodMI* mi, const CMPIContext* context, const CMPIResult* result,
                                const CMPIObjectPath* path, const char* method, const CMPIArgs* in, CMPIArgs* out);
 };
@@ -120,19 +118,19 @@ struct _CMPIPropertyMIFT {
     const char* miName;
     CMPIStatus (*cleanup)(CMPIPropertyMI* mi, const CMPIContext* context, CMPIBoolean terminating);
 
-    /** Sets a property of the instance that the path names. */
+    /** Sets a property of the instance with the path. */
     CMPIStatus (*setProperty)(CMPIPropertyMI* mi, const CMPIContext* context, const CMPIResult* result,
                               const CMPIObjectPath* path, const char* name, const CMPIData data);
-    /** Returns a property of the instance that the path names, as data. */
+    /** Returns a property of the instance with the path, as data. */
     CMPIStatus (*getProperty)(CMPIPropertyMI* mi, const CMPIContext* context, const CMPIResult* result,
                               const CMPIObjectPath* path, const char* name);
-    /** As setProperty, with the class that declares the property. Since CMPI 2.0; may be null. */
+    /** Like setProperty, with the class that declares the property. Since CMPI 2.0; may be null. */
     CMPIStatus (*setPropertyWithOrigin)(CMPIPropertyMI* mi, const CMPIContext* context, const CMPIResult* result,
                                         CMPIObjectPath* path, const char* name, const CMPIData data,
                                         const char* origin);
 };
 
-/** Indications of a class. Filters are select expressions; a filter is known by its address. */
+/** Indications of a class. Filters are select expressions, identified by their address. */
 struct _CMPIIndicationMI {
     void* hdl;
     CMPIIndicationMIFT* ft;
@@ -144,21 +142,21 @@ struct _CMPIIndicationMIFT {
     const char* miName;
     CMPIStatus (*cleanup)(CMPIIndicationMI* mi, const CMPIContext* context, CMPIBoolean terminating);
 
-    /** CMPI_RC_OK when the owner may subscribe with a filter to indications of a class. */
+    /** Returns CMPI_RC_OK if the owner may subscribe with a filter to indications of a class. */
     CMPIStatus (*authorizeFilter)(CMPIIndicationMI* mi, const CMPIContext* context, const CMPISelectExp* filter,
                                   const char* className, const CMPIObjectPath* path, const char* owner);
-    /** CMPI_RC_OK when the broker must poll instances, because the provider does not notice changes itself. */
+    /** Returns CMPI_RC_OK if the broker must poll instances, because the provider does not detect changes. */
     CMPIStatus (*mustPoll)(CMPIIndicationMI* mi, const CMPIContext* context, const CMPISelectExp* filter,
                            const char* className, const CMPIObjectPath* path);
-    /** Somebody subscribed with a filter; `first` says that it is the first for this class. */
+    /** Reports a new subscription with a filter; `first` is true if it is the first for this class. */
     CMPIStatus (*activateFilter)(CMPIIndicationMI* mi, const CMPIContext* context, const CMPISelectExp* filter,
                                  const char* className, const CMPIObjectPath* path, CMPIBoolean first);
-    /** A subscription ended; `last` says that it was the last for this class. */
+    /** Reports the end of a subscription; `last` is true if it was the last for this class. */
     CMPIStatus (*deActivateFilter)(CMPIIndicationMI* mi, const CMPIContext* context, const CMPISelectExp* filter,
                                    const char* className, const CMPIObjectPath* path, CMPIBoolean last);
-    /** From here on indications may be delivered. */
+    /** Allows the provider to deliver indications. */
     CMPIStatus (*enableIndications)(CMPIIndicationMI* mi, const CMPIContext* context);
-    /** No indication may be delivered until they are enabled again. */
+    /** Forbids the provider to deliver indications until they are enabled again. */
     CMPIStatus (*disableIndications)(CMPIIndicationMI* mi, const CMPIContext* context);
 };
 

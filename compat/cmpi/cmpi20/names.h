@@ -1,7 +1,4 @@
-/*
- * The names of all structures of CMPI 2.0, so that each can be mentioned before it is defined.
- * Included by cmpidt.h.
- */
+/* Forward declarations of all structures of CMPI 2.0. Included by cmpidt.h. */
 #ifndef CMPI20_NAMES_H
 #define CMPI20_NAMES_H
 
@@ -10,7 +7,7 @@ extern "C" {
 #endif
 
 /** @name Plain data
- * Defined in cmpidt.h; passed by value or filled in place, nobody has to release them.
+ * Defined in cmpidt.h; passed by value or filled in place, and never released.
  */
 ///@{
 typedef struct _CMPIValuePtr CMPIValuePtr;
@@ -20,7 +17,7 @@ typedef struct _CMPIStatus CMPIStatus;
 ///@}
 
 /** @name The broker
- * The object manager as a provider sees it, and its four function tables.
+ * The object manager and its four function tables.
  */
 ///@{
 typedef struct _CMPIBroker CMPIBroker;
@@ -31,7 +28,7 @@ typedef struct _CMPIBrokerMemFT CMPIBrokerMemFT;
 ///@}
 
 /** @name Objects of a request
- * What every call into a provider carries, each with its function table.
+ * Arguments of every call to a provider, each with its function table.
  */
 ///@{
 typedef struct _CMPIContext CMPIContext;
@@ -43,9 +40,8 @@ typedef struct _CMPIErrorFT CMPIErrorFT;
 ///@}
 
 /** @name CIM objects and values
- * Opaque objects of the broker, each with its function table. An object that the broker makes for
- * a provider belongs to the broker and is gone when the request ends; only a clone has to be
- * released by whoever made it.
+ * Opaque objects of the broker, each with its function table. An object that the broker creates for a provider belongs
+ * to the broker and is valid until the request ends. Only clones must be released by the caller.
  */
 ///@{
 typedef struct _CMPIInstance CMPIInstance;
@@ -80,7 +76,7 @@ typedef struct _CMPIPredicateFT CMPIPredicateFT;
 ///@}
 
 /** @name Management interfaces
- * What a provider gives the broker, one a kind of operation, each with its function table.
+ * The interfaces of a provider, one per kind of operation, each with its function table.
  */
 ///@{
 typedef struct _CMPIInstanceMI CMPIInstanceMI;

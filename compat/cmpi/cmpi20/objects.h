@@ -1,6 +1,6 @@
 /*
- * Instances, object paths and the values in them. Included by cmpift.h, which states what holds for
- * all tables. Names of properties, keys and arguments are compared without regard to letter case.
+ * Instances, object paths and their values. Included by cmpift.h, which documents the rules for all tables. Names of
+ * properties, keys and arguments are case-insensitive.
  */
 #ifndef CMPI20_OBJECTS_H
 #define CMPI20_OBJECTS_H
@@ -22,24 +22,24 @@ struct _CMPIInstanceFT {
     CMPIStatus (*release)(CMPIInstance* instance);
     CMPIInstance* (*clone)(const CMPIInstance* instance, CMPIStatus* rc);
 
-    /** The property of a name; CMPI_RC_ERR_NO_SUCH_PROPERTY when there is none. */
+    /** Returns the property with the name, or CMPI_RC_ERR_NO_SUCH_PROPERTY. */
     CMPIData (*getProperty)(const CMPIInstance* instance, const char* name, CMPIStatus* rc);
-    /** The property at a position; `name`, unless null, receives its name. */
+    /** Returns the property at an index; `name`, unless null, receives its name. */
     CMPIData (*getPropertyAt)(const CMPIInstance* instance, CMPICount index, CMPIString** name, CMPIStatus* rc);
-    /** How many properties there are. */
+    /** Returns the number of properties. */
     CMPICount (*getPropertyCount)(const CMPIInstance* instance, CMPIStatus* rc);
     /**
-     * Sets a property; a null value makes it null, still of that type. A property outside of the
-     * instance's property filter is left out without an error.
+     * Sets a property. A null value sets the property to null and keeps the type. A property that the instance's
+     * property filter excludes is ignored without an error.
      */
     CMPIStatus (*setProperty)(const CMPIInstance* instance, const char* name, const CMPIValue* value, CMPIType type);
-    /** The path of the instance. */
+    /** Returns the path of the instance. */
     CMPIObjectPath* (*getObjectPath)(const CMPIInstance* instance, CMPIStatus* rc);
-    /** Restricts what setProperty takes to a property list and, in any case, the listed keys. */
+    /** Restricts setProperty to a property list and the listed keys. */
     CMPIStatus (*setPropertyFilter)(CMPIInstance* instance, const char** properties, const char** keys);
-    /** Gives the instance another path; the keys' properties are the caller's to keep equal. */
+    /** Replaces the path of the instance. The caller must keep the key properties consistent. */
     CMPIStatus (*setObjectPath)(CMPIInstance* instance, const CMPIObjectPath* path);
-    /** As setProperty, with the class that declares the property; a null origin is unknown. */
+    /** Like setProperty, with the class that declares the property. A null origin means unknown. */
     CMPIStatus (*setPropertyWithOrigin)(const CMPIInstance* instance, const char* name, const CMPIValue* value,
                                         const CMPIType type, const char* origin);
 };
@@ -56,7 +56,7 @@ struct _CMPIObjectPathFT {
     CMPIObjectPath* (*clone)(const CMPIObjectPath* path, CMPIStatus* rc);
 
     /** @name Namespace, host and class
-     * A part that was never set is answered as null or as a string without characters.
+     * A part that was never set is null or a string without characters.
      */
     ///@{
     CMPIStatus (*setNameSpace)(CMPIObjectPath* path, const char* nameSpace);
@@ -70,24 +70,23 @@ struct _CMPIObjectPathFT {
     /** @name Keys */
     ///@{
 
-    /** Adds a key, or replaces the value of the one of that name. */
+    /** Adds a key, or replaces the value of an existing key. */
     CMPIStatus (*addKey)(CMPIObjectPath* path, const char* name, const CMPIValue* value, const CMPIType type);
-    /** The key of a name; CMPI_RC_ERR_NOT_FOUND when there is none. */
+    /** Returns the key with the name, or CMPI_RC_ERR_NOT_FOUND. */
     CMPIData (*getKey)(const CMPIObjectPath* path, const char* name, CMPIStatus* rc);
-    /** The key at a position; `name`, unless null, receives its name. */
+    /** Returns the key at an index; `name`, unless null, receives its name. */
     CMPIData (*getKeyAt)(const CMPIObjectPath* path, CMPICount index, CMPIString** name, CMPIStatus* rc);
-    /** How many keys there are. */
+    /** Returns the number of keys. */
     CMPICount (*getKeyCount)(const CMPIObjectPath* path, CMPIStatus* rc);
     ///@}
 
-    /** Takes the namespace of another path. */
+    /** Copies the namespace of another path. */
     CMPIStatus (*setNameSpaceFromObjectPath)(CMPIObjectPath* path, const CMPIObjectPath* source);
-    /** Takes host and namespace of another path. */
+    /** Copies host and namespace of another path. */
     CMPIStatus (*setHostAndNameSpaceFromObjectPath)(CMPIObjectPath* path, const CMPIObjectPath* source);
 
     /** @name Qualifiers of the path's class
-     * Of the class itself, or of a property, a method or a method's parameter. Many brokers do not
-     * support these.
+     * Qualifiers of the class, a property, a method or a method's parameter. Many brokers do not support them.
      */
     ///@{
     CMPIData (*getClassQualifier)(const CMPIObjectPath* path, const char* qualifier, CMPIStatus* rc);
@@ -99,11 +98,11 @@ struct _CMPIObjectPathFT {
                                       const char* qualifier, CMPIStatus* rc);
     ///@}
 
-    /** The path as text; its form is the broker's. Paths are not compared by it. */
+    /** Returns the path as a string in a format of the broker. Do not compare paths by this string. */
     CMPIString* (*toString)(const CMPIObjectPath* path, CMPIStatus* rc);
 };
 
-/** The named arguments of a method, those that go in or those that come out. */
+/** The named input or output arguments of a method. */
 struct _CMPIArgs {
     void* hdl;
     CMPIArgsFT* ft;
@@ -114,17 +113,17 @@ struct _CMPIArgsFT {
     CMPIStatus (*release)(CMPIArgs* args);
     CMPIArgs* (*clone)(const CMPIArgs* args, CMPIStatus* rc);
 
-    /** Adds an argument, or replaces the one of that name. */
+    /** Adds an argument, or replaces the value of an existing one. */
     CMPIStatus (*addArg)(const CMPIArgs* args, const char* name, const CMPIValue* value, const CMPIType type);
-    /** The argument of a name. */
+    /** Returns the argument with the name. */
     CMPIData (*getArg)(const CMPIArgs* args, const char* name, CMPIStatus* rc);
-    /** The argument at a position; `name`, unless null, receives its name. */
+    /** Returns the argument at an index; `name`, unless null, receives its name. */
     CMPIData (*getArgAt)(const CMPIArgs* args, CMPICount index, CMPIString** name, CMPIStatus* rc);
-    /** How many arguments there are. */
+    /** Returns the number of arguments. */
     CMPICount (*getArgCount)(const CMPIArgs* args, CMPIStatus* rc);
 };
 
-/** Text, in UTF-8. */
+/** A string in UTF-8. */
 struct _CMPIString {
     void* hdl;
     CMPIStringFT* ft;
@@ -135,11 +134,11 @@ struct _CMPIStringFT {
     CMPIStatus (*release)(CMPIString* string);
     CMPIString* (*clone)(const CMPIString* string, CMPIStatus* rc);
 
-    /** The characters, ended by a zero. They live as long as the string does, and may be null. */
+    /** Returns the null-terminated characters, which are valid as long as the string; may be null. */
     const char* (*getCharPtr)(const CMPIString* string, CMPIStatus* rc);
 };
 
-/** An array of fixed size, all of whose elements are of one type. */
+/** An array of fixed size whose elements have the same type. */
 struct _CMPIArray {
     void* hdl;
     CMPIArrayFT* ft;
@@ -150,17 +149,17 @@ struct _CMPIArrayFT {
     CMPIStatus (*release)(CMPIArray* array);
     CMPIArray* (*clone)(const CMPIArray* array, CMPIStatus* rc);
 
-    /** How many elements there are. */
+    /** Returns the number of elements. */
     CMPICount (*getSize)(const CMPIArray* array, CMPIStatus* rc);
-    /** The type of an element. */
+    /** Returns the type of an element. */
     CMPIType (*getSimpleType)(const CMPIArray* array, CMPIStatus* rc);
-    /** The element at a position. */
+    /** Returns the element at an index. */
     CMPIData (*getElementAt)(const CMPIArray* array, CMPICount index, CMPIStatus* rc);
-    /** Sets the element at a position; a null value makes it null. The type must be the array's. */
+    /** Sets the element at an index; a null value sets it to null. The type must be the array's. */
     CMPIStatus (*setElementAt)(CMPIArray* array, CMPICount index, const CMPIValue* value, CMPIType type);
 };
 
-/** What an up-call answers: elements that are read once, in order. */
+/** The result of an up-call: elements that are read once, in order. */
 struct _CMPIEnumeration {
     void* hdl;
     CMPIEnumerationFT* ft;
@@ -171,11 +170,11 @@ struct _CMPIEnumerationFT {
     CMPIStatus (*release)(CMPIEnumeration* enumeration);
     CMPIEnumeration* (*clone)(const CMPIEnumeration* enumeration, CMPIStatus* rc);
 
-    /** The next element; an error at the end. */
+    /** Returns the next element, or an error at the end. */
     CMPIData (*getNext)(const CMPIEnumeration* enumeration, CMPIStatus* rc);
-    /** Whether there is a next element. */
+    /** Returns whether there is a next element. */
     CMPIBoolean (*hasNext)(const CMPIEnumeration* enumeration, CMPIStatus* rc);
-    /** All elements as an array. */
+    /** Returns all elements as an array. */
     CMPIArray* (*toArray)(const CMPIEnumeration* enumeration, CMPIStatus* rc);
 };
 
@@ -190,11 +189,11 @@ struct _CMPIDateTimeFT {
     CMPIStatus (*release)(CMPIDateTime* dateTime);
     CMPIDateTime* (*clone)(const CMPIDateTime* dateTime, CMPIStatus* rc);
 
-    /** Microseconds: since 1970-01-01 UTC, or of the interval. */
+    /** Returns microseconds: since 1970-01-01 UTC, or of the interval. */
     CMPIUint64 (*getBinaryFormat)(const CMPIDateTime* dateTime, CMPIStatus* rc);
-    /** The 25 characters of CIM's text form. */
+    /** Returns the 25-character CIM string. */
     CMPIString* (*getStringFormat)(const CMPIDateTime* dateTime, CMPIStatus* rc);
-    /** Whether it is an interval. */
+    /** Returns whether it is an interval. */
     CMPIBoolean (*isInterval)(const CMPIDateTime* dateTime, CMPIStatus* rc);
 };
 

@@ -1,6 +1,6 @@
 /*
- * Queries and filters, whole and taken apart. Included by cmpift.h, which states what holds for all
- * tables. What is taken out of an expression lives as long as the expression does.
+ * Queries and filters, complete or as their parts. Included by cmpift.h, which documents the rules for all tables. The
+ * parts of an expression are valid as long as the expression.
  */
 #ifndef CMPI20_QUERIES_H
 #define CMPI20_QUERIES_H
@@ -22,20 +22,22 @@ struct _CMPISelectExpFT {
     CMPIStatus (*release)(CMPISelectExp* expression);
     CMPISelectExp* (*clone)(const CMPISelectExp* expression, CMPIStatus* rc);
 
-    /** Whether the expression selects an instance. */
+    /** Returns whether the expression selects an instance. */
     CMPIBoolean (*evaluate)(const CMPISelectExp* expression, const CMPIInstance* instance, CMPIStatus* rc);
-    /** The expression as it was written. */
+    /** Returns the original expression. */
     CMPIString* (*getString)(const CMPISelectExp* expression, CMPIStatus* rc);
-    /** Its condition as a disjunction of conjunctions; null when it has none. */
+    /** Returns its condition as a disjunction of conjunctions; null if it has none. */
     CMPISelectCond* (*getDOC)(const CMPISelectExp* expression, CMPIStatus* rc);
-    /** Its condition as a conjunction of disjunctions; null when it has none. */
+    /** Returns its condition as a conjunction of disjunctions; null if it has none. */
     CMPISelectCond* (*getCOD)(const CMPISelectExp* expression, CMPIStatus* rc);
-    /** Whether the expression selects what an accessor reads; the accessor is given `parameter`. */
+    /**
+     * Returns whether the expression selects the properties that an accessor reads. The accessor receives `parameter`.
+     */
     CMPIBoolean (*evaluateUsingAccessor)(const CMPISelectExp* expression, CMPIAccessor* accessor, void* parameter,
                                          CMPIStatus* rc);
 };
 
-/** A condition: sub-conditions joined in one way. */
+/** A condition: a disjunction or conjunction of sub-conditions. */
 struct _CMPISelectCond {
     void* hdl;
     CMPISelectCondFT* ft;
@@ -46,13 +48,13 @@ struct _CMPISelectCondFT {
     CMPIStatus (*release)(CMPISelectCond* condition);
     CMPISelectCond* (*clone)(const CMPISelectCond* condition, CMPIStatus* rc);
 
-    /** How many sub-conditions there are; `type`, unless null, receives a CMPISelectCondType. */
+    /** Returns the number of sub-conditions; `type`, unless null, receives a CMPISelectCondType. */
     CMPICount (*getCountAndType)(const CMPISelectCond* condition, int* type, CMPIStatus* rc);
-    /** The sub-condition at a position. */
+    /** Returns the sub-condition at an index. */
     CMPISubCond* (*getSubCondAt)(const CMPISelectCond* condition, CMPICount index, CMPIStatus* rc);
 };
 
-/** A sub-condition: predicates, joined in the way that the condition's sub-conditions are not. */
+/** A sub-condition: a conjunction of predicates in a disjunction, and vice versa. */
 struct _CMPISubCond {
     void* hdl;
     CMPISubCondFT* ft;
@@ -63,15 +65,15 @@ struct _CMPISubCondFT {
     CMPIStatus (*release)(CMPISubCond* subCondition);
     CMPISubCond* (*clone)(const CMPISubCond* subCondition, CMPIStatus* rc);
 
-    /** How many predicates there are. */
+    /** Returns the number of predicates. */
     CMPICount (*getCount)(const CMPISubCond* subCondition, CMPIStatus* rc);
-    /** The predicate at a position. */
+    /** Returns the predicate at an index. */
     CMPIPredicate* (*getPredicateAt)(const CMPISubCond* subCondition, CMPICount index, CMPIStatus* rc);
-    /** The predicate whose left side is that name. */
+    /** Returns the predicate whose left side is the name. */
     CMPIPredicate* (*getPredicate)(const CMPISubCond* subCondition, const char* name, CMPIStatus* rc);
 };
 
-/** A predicate: two sides and what compares them. */
+/** A predicate: two operands and an operator. */
 struct _CMPIPredicate {
     void* hdl;
     CMPIPredicateFT* ft;
@@ -82,10 +84,13 @@ struct _CMPIPredicateFT {
     CMPIStatus (*release)(CMPIPredicate* predicate);
     CMPIPredicate* (*clone)(const CMPIPredicate* predicate, CMPIStatus* rc);
 
-    /** Takes a predicate apart; `type` is that of the right side. Whatever is null is not wanted. */
+    /** Returns the parts of a predicate; `type` is the type of the right side. Null pointers are ignored. */
     CMPIStatus (*getData)(const CMPIPredicate* predicate, CMPIType* type, CMPIPredOp* operation, CMPIString** leftSide,
                           CMPIString** rightSide);
-    /** Whether the predicate holds for what an accessor reads; the accessor is given `parameter`. */
+    /**
+     * Returns whether the predicate is true for the properties that an accessor reads. The accessor receives
+     * `parameter`.
+     */
     CMPIBoolean (*evaluateUsingAccessor)(const CMPIPredicate* predicate, CMPIAccessor* accessor, void* parameter,
                                          CMPIStatus* rc);
 };

@@ -1,6 +1,6 @@
 /*
- * What every request carries: its context, where its results go, and errors that say more than a
- * status. Included by cmpift.h, which states what holds for all tables.
+ * Objects of every request: context, result and detailed errors. Included by cmpift.h, which documents the rules for
+ * all tables.
  */
 #ifndef CMPI20_REQUEST_H
 #define CMPI20_REQUEST_H
@@ -11,7 +11,7 @@
 extern "C" {
 #endif
 
-/** The circumstances of a request: named entries. Borrowed from the caller for one call. */
+/** The context of a request: named entries. Borrowed from the caller for one call. */
 struct _CMPIContext {
     void* hdl;
     CMPIContextFT* ft;
@@ -22,19 +22,19 @@ struct _CMPIContextFT {
     CMPIStatus (*release)(CMPIContext* context);
     CMPIContext* (*clone)(const CMPIContext* context, CMPIStatus* rc);
 
-    /** The entry of a name; CMPIPrincipal and its like in cmpidt.h are the usual ones. */
+    /** Returns the entry with the name. cmpidt.h defines the usual names, such as CMPIPrincipal. */
     CMPIData (*getEntry)(const CMPIContext* context, const char* name, CMPIStatus* rc);
-    /** The entry at a position; `name`, unless null, receives its name. */
+    /** Returns the entry at an index; `name`, unless null, receives its name. */
     CMPIData (*getEntryAt)(const CMPIContext* context, CMPICount index, CMPIString** name, CMPIStatus* rc);
-    /** How many entries there are. */
+    /** Returns the number of entries. */
     CMPICount (*getEntryCount)(const CMPIContext* context, CMPIStatus* rc);
-    /** Adds an entry, or replaces the one of that name. */
+    /** Adds an entry, or replaces the value of an existing one. */
     CMPIStatus (*addEntry)(const CMPIContext* context, const char* name, const CMPIValue* value, const CMPIType type);
 };
 
 /**
- * Where a provider puts what an operation answers, one element at a time. The broker takes over what
- * is returned: it must not be changed or released afterwards. Borrowed from the caller for one call.
+ * Receives the results of an operation, one element per call. The broker takes ownership of returned objects: providers
+ * must not change or release them afterwards. Borrowed from the caller for one call.
  */
 struct _CMPIResult {
     void* hdl;
@@ -46,19 +46,19 @@ struct _CMPIResultFT {
     CMPIStatus (*release)(CMPIResult* result);
     CMPIResult* (*clone)(const CMPIResult* result, CMPIStatus* rc);
 
-    /** Returns a value: of a property, or what a method answers. */
+    /** Returns the value of a property or the result of a method. */
     CMPIStatus (*returnData)(const CMPIResult* result, const CMPIValue* value, const CMPIType type);
     /** Returns an instance. */
     CMPIStatus (*returnInstance)(const CMPIResult* result, const CMPIInstance* instance);
     /** Returns an object path. */
     CMPIStatus (*returnObjectPath)(const CMPIResult* result, const CMPIObjectPath* path);
-    /** Says that nothing more follows. */
+    /** Reports that all results were returned. */
     CMPIStatus (*returnDone)(const CMPIResult* result);
-    /** Returns an error object; the operation's status still has to say that it failed. */
+    /** Returns an error object. The operation must still return an error status. */
     CMPIStatus (*returnError)(const CMPIResult* result, const CMPIError* error);
 };
 
-/** An error as the CIM schema describes one. Texts that were never set are null. */
+/** An error as defined by the CIM schema. Strings that were never set are null. */
 struct _CMPIError {
     void* hdl;
     CMPIErrorFT* ft;
@@ -72,29 +72,29 @@ struct _CMPIErrorFT {
     /** @name Reading */
     ///@{
     CMPIErrorType (*getErrorType)(const CMPIError* error, CMPIStatus* rc);
-    /** The type in words, when it is OtherErrorType. */
+    /** Returns the description of the type if the type is OtherErrorType. */
     CMPIString* (*getOtherErrorType)(const CMPIError* error, CMPIStatus* rc);
-    /** Who defined the message id, such as an organisation. */
+    /** Returns the owner of the message id, such as an organisation. */
     CMPIString* (*getOwningEntity)(const CMPIError* error, CMPIStatus* rc);
     CMPIString* (*getMessageID)(const CMPIError* error, CMPIStatus* rc);
     CMPIString* (*getMessage)(const CMPIError* error, CMPIStatus* rc);
     CMPIErrorSeverity (*getPerceivedSeverity)(const CMPIError* error, CMPIStatus* rc);
     CMPIErrorProbableCause (*getProbableCause)(const CMPIError* error, CMPIStatus* rc);
     CMPIString* (*getProbableCauseDescription)(const CMPIError* error, CMPIStatus* rc);
-    /** What can be done about it: an array of strings. */
+    /** Returns the recommended actions, an array of strings. */
     CMPIArray* (*getRecommendedActions)(const CMPIError* error, CMPIStatus* rc);
-    /** Which object reports it, written in the source format. */
+    /** Returns the object that reports the error, in the source format. */
     CMPIString* (*getErrorSource)(const CMPIError* error, CMPIStatus* rc);
     CMPIErrorSrcFormat (*getErrorSourceFormat)(const CMPIError* error, CMPIStatus* rc);
-    /** The source format in words, when it is CMPIErrSrcOther. */
+    /** Returns the description of the source format if that is CMPIErrSrcOther. */
     CMPIString* (*getOtherErrorSourceFormat)(const CMPIError* error, CMPIStatus* rc);
     CMPIrc (*getCIMStatusCode)(const CMPIError* error, CMPIStatus* rc);
     CMPIString* (*getCIMStatusCodeDescription)(const CMPIError* error, CMPIStatus* rc);
-    /** What fills the place holders of the message: an array of strings. */
+    /** Returns the values of the message's placeholders, an array of strings. */
     CMPIArray* (*getMessageArguments)(const CMPIError* error, CMPIStatus* rc);
     ///@}
 
-    /** @name Setting what its maker does not take */
+    /** @name Setting attributes that newCMPIError does not set */
     ///@{
     CMPIStatus (*setErrorType)(CMPIError* error, const CMPIErrorType type);
     CMPIStatus (*setOtherErrorType)(CMPIError* error, const char* type);

@@ -1,18 +1,16 @@
 /*
- * Stubs: macros that stand once in a provider's source file and define a function table, an
- * interface with it, and the factory that the broker looks for. Included by cmpimacs.h.
+ * Stubs: macros for a provider's source file. Each defines a function table, an interface with this table, and the
+ * factory that the broker looks up. Included by cmpimacs.h.
  *
- * Each takes
- *   prefix   what the names of the provider's functions begin with; they are listed at each macro and
- *            have to be declared before it
- *   miname   the provider's name in its registration, without quotes; the factory's name begins
- *            with it, and the interface's name ends with it
+ * Parameters:
+ *   prefix   prefix of the provider's functions, which each macro lists and which must be declared before it
+ *   miname   the provider's name in its registration, without quotes; the prefix of the factory's name and
+ *            the suffix of the interface's name
  *   broker   a variable of type const CMPIBroker*, which receives the broker
- *   hook     a statement that the factory executes last, such as a call that initialises the
- *            provider; CMNoHook for none. It sees the factory's arguments brkr, ctx and rc; rc may
- *            be null.
+ *   hook     a statement at the end of the factory, for example a call that initializes the provider; CMNoHook
+ *            for none. It can use the factory's arguments brkr, ctx and rc; rc may be null.
  *
- * The tables live as long as the library does, and every call of a factory answers the same interface.
+ * The tables are valid as long as the library is loaded, and every call of a factory returns the same interface.
  */
 #ifndef CMPI20_STUBS_H
 #define CMPI20_STUBS_H
@@ -25,13 +23,13 @@
 #define CMPI_EXTERN_C extern
 #endif
 
-/** What a factory needs, to be found in a library that hides its symbols otherwise. */
+/** Exports a factory from a library with hidden visibility. */
 #define CMPI_FACTORY CMPI_EXTERN_C __attribute__((visibility("default")))
 
-/** The hook of a provider that has nothing to do when its factory is called. */
+/** Hook of a provider without initialization. */
 #define CMNoHook ((void)0)
 
-/** Defines the factory of an interface of a kind over the table that was defined before it. */
+/** Defines the factory of an interface. The interface's table must be defined first. */
 #define CMPI_DEFINE_FACTORY(kind, miname, broker, hook)                                                          \
     CMPI_FACTORY CMPI##kind##MI* miname##_Create_##kind##MI(const CMPIBroker* brkr, const CMPIContext* ctx,      \
                                                             CMPIStatus* rc);                                     \
@@ -45,9 +43,8 @@
     }
 
 /**
- * An instance provider, of prefixCleanup, prefixEnumInstanceNames, prefixEnumInstances,
- * prefixGetInstance, prefixCreateInstance, prefixModifyInstance, prefixDeleteInstance and
- * prefixExecQuery.
+ * An instance provider with prefixCleanup, prefixEnumInstanceNames, prefixEnumInstances, prefixGetInstance,
+ * prefixCreateInstance, prefixModifyInstance, prefixDeleteInstance and prefixExecQuery.
  */
 #define CMInstanceMIStub(prefix, miname, broker, hook)                                                  \
     static CMPIInstanceMIFT miname##InstanceMIFT_ = {                                                   \
@@ -57,8 +54,8 @@
     CMPI_DEFINE_FACTORY(Instance, miname, broker, hook)
 
 /**
- * An association provider, of prefixAssociationCleanup, prefixAssociators, prefixAssociatorNames,
- * prefixReferences and prefixReferenceNames.
+ * An association provider with prefixAssociationCleanup, prefixAssociators, prefixAssociatorNames, prefixReferences and
+ * prefixReferenceNames.
  */
 #define CMAssociationMIStub(prefix, miname, broker, hook)                                                \
     static CMPIAssociationMIFT miname##AssociationMIFT_ = {                                              \
@@ -66,15 +63,15 @@
         prefix##Associators, prefix##AssociatorNames, prefix##References,    prefix##ReferenceNames};    \
     CMPI_DEFINE_FACTORY(Association, miname, broker, hook)
 
-/** A method provider, of prefixMethodCleanup and prefixInvokeMethod. */
+/** A method provider with prefixMethodCleanup and prefixInvokeMethod. */
 #define CMMethodMIStub(prefix, miname, broker, hook)                                                       \
     static CMPIMethodMIFT miname##MethodMIFT_ = {CMPICurrentVersion, CMPICurrentVersion, "method" #miname, \
                                                  prefix##MethodCleanup, prefix##InvokeMethod};             \
     CMPI_DEFINE_FACTORY(Method, miname, broker, hook)
 
 /**
- * A property provider, of prefixPropertyCleanup, prefixSetProperty and prefixGetProperty. The slot
- * of setPropertyWithOrigin, which came with CMPI 2.0, stays null.
+ * A property provider with prefixPropertyCleanup, prefixSetProperty and prefixGetProperty. The slot of
+ * setPropertyWithOrigin, which was added in CMPI 2.0, is null.
  */
 #define CMPropertyMIStub(prefix, miname, broker, hook)                        \
     static CMPIPropertyMIFT miname##PropertyMIFT_ = {CMPICurrentVersion,      \
@@ -87,8 +84,8 @@
     CMPI_DEFINE_FACTORY(Property, miname, broker, hook)
 
 /**
- * An indication provider, of prefixIndicationCleanup, prefixAuthorizeFilter, prefixMustPoll,
- * prefixActivateFilter, prefixDeActivateFilter, prefixEnableIndications and prefixDisableIndications.
+ * An indication provider with prefixIndicationCleanup, prefixAuthorizeFilter, prefixMustPoll, prefixActivateFilter,
+ * prefixDeActivateFilter, prefixEnableIndications and prefixDisableIndications.
  */
 #define CMIndicationMIStub(prefix, miname, broker, hook)                                                         \
     static CMPIIndicationMIFT miname##IndicationMIFT_ = {                                                        \
