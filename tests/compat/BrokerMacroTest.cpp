@@ -16,7 +16,7 @@ const char* const assocClass = "AssocClass";
 const char* const role = "Role";
 const char* const resultRole = "ResultRole";
 
-/** A broker whose tables are empty but for the slot that a test is about. */
+/** A broker whose tables are empty except for the slot under test. */
 class BrokerMacros : public testing::Test {
 protected:
     CMPIBrokerFT services{};
@@ -30,7 +30,7 @@ protected:
     const char* name = "Name";
 };
 
-TEST_F(BrokerMacros, MakeObjects) {
+TEST_F(BrokerMacros, CreateObjects) {
     EXPECT_CALL_OF(makers.newInstance, CMNewInstance(broker, &path, rc), broker, &path, rc);
     EXPECT_CALL_OF(makers.newObjectPath, CMNewObjectPath(broker, nameSpace, name, rc), broker, nameSpace, name, rc);
     EXPECT_CALL_OF(makers.newArgs, CMNewArgs(broker, rc), broker, rc);
@@ -47,7 +47,7 @@ TEST_F(BrokerMacros, MakeObjects) {
                    broker, owner, id, message, ErrorSevLow, ErrorProbCauseOther, CMPI_RC_ERROR, rc);
 }
 
-TEST_F(BrokerMacros, AskAboutObjects) {
+TEST_F(BrokerMacros, ReturnInformationAboutObjects) {
     EXPECT_CALL_OF(makers.toString, CDToString(broker, &path, rc), broker, &path, rc);
     EXPECT_CALL_OF(makers.isOfType, CDIsOfType(broker, &path, name, rc), broker, &path, name, rc);
     EXPECT_CALL_OF(makers.getType, CDGetType(broker, &path, rc), broker, &path, rc);
@@ -140,7 +140,7 @@ TEST_F(BrokerMacros, ReturnAStatus) {
     EXPECT_EQ(status.rc, CMPI_RC_ERR_NOT_FOUND);
 }
 
-TEST_F(BrokerMacros, FillAStatus) {
+TEST_F(BrokerMacros, SetAStatus) {
     CMPIString string{};
     CMPIStatus status{CMPI_RC_OK, &string};
     CMSetStatus(&status, CMPI_RC_ERROR);
@@ -157,7 +157,7 @@ TEST_F(BrokerMacros, FillAStatus) {
     EXPECT_EQ(status.rc, CMPI_RC_ERR_NOT_FOUND);
 }
 
-TEST_F(BrokerMacros, FillNoStatusWhenNobodyWantsOne) {
+TEST_F(BrokerMacros, IgnoreANullStatus) {
     CMPIStatus* const nobody = nullptr;
     recorder::calls.clear();
     makers.newString = recorder::record<CMPIString*, const CMPIBroker*, const char*, CMPIStatus*>;

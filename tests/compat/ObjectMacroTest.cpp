@@ -12,7 +12,7 @@ const char* const third = "Third";
 const CMPICount index = 3;
 CMPIString** const out = recorder::answer<CMPIString**>();
 
-/** An object whose table is empty but for the slot that a test is about. */
+/** An object whose table is empty except for the slot under test. */
 template <class Object, class Table>
 struct Empty {
     Table table{};
@@ -108,7 +108,7 @@ TEST(ArgsMacros, CallTheArguments) {
     EXPECT_CALL_OF(table.getArgCount, CMGetArgCount(&object, rc), &object, rc);
 }
 
-TEST(StringMacros, AnswerTheCharactersWithAndWithoutAStatus) {
+TEST(StringMacros, ReturnTheCharactersWithAndWithoutAStatus) {
     Empty<CMPIString, CMPIStringFT> made;
     auto& table = made.table;
     auto& object = made.object;
@@ -196,7 +196,7 @@ TEST(ObjectMacros, ReleaseAndCloneAnyObject) {
     EXPECT_CALL_OF(string.table.clone, CMClone(&string.object, rc), &string.object, rc);
 }
 
-TEST(ObjectMacros, TellNullObjects) {
+TEST(ObjectMacros, DetectNullObjects) {
     Empty<CMPIString, CMPIStringFT> made;
     CMPIString* object = nullptr;
     EXPECT_TRUE(CMIsNullObject(object));
@@ -206,7 +206,7 @@ TEST(ObjectMacros, TellNullObjects) {
     EXPECT_FALSE(CMIsNullObject(object));
 }
 
-TEST(ObjectMacros, TellNullValuesKeysAndArrays) {
+TEST(ObjectMacros, DetectNullValuesKeysAndArrays) {
     CMPIData data{};
     data.type = CMPI_stringA;
     EXPECT_FALSE(CMIsNullValue(data));

@@ -6,10 +6,10 @@
 #include <type_traits>
 #include <vector>
 
-/** Function pointers that note how they were called, to be put into hand-made function tables. */
+/** Function pointers that record their calls, for use in function tables. */
 namespace recorder {
 
-/** Arguments or a result, flattened: integers as they are, pointers as their address. */
+/** Arguments or a result as integers: integers unchanged, pointers as their address. */
 using Words = std::vector<std::uintptr_t>;
 
 inline void append(Words& words, const CMPIStatus& status) {
@@ -39,7 +39,7 @@ Words words(const Values&... values) {
     return result;
 }
 
-/** What a recording function answers: a value of the result's type that no zeroed memory has. */
+/** Result of a recording function: a nonzero value of the result's type. */
 template <class Result>
 Result answer() {
     if constexpr (std::is_same_v<Result, CMPIStatus>) {
@@ -67,7 +67,7 @@ Result record(Arguments... arguments) {
 
 /**
  * Runs a call while one slot of a table records.
- * @return what the slot was called with; empty unless it was called once and its answer came back
+ * @return the slot's arguments; empty unless the slot was called once and the call returned its result
  */
 template <class Result, class... Arguments, class Call>
 Words callsOf(Result (*&slot)(Arguments...), const Call& call) {
@@ -80,6 +80,6 @@ Words callsOf(Result (*&slot)(Arguments...), const Call& call) {
 
 }  // namespace recorder
 
-/** Expects a macro to call one slot of a table, once, with these arguments, and to hand its answer on. */
+/** Expects that a macro calls one slot of a table once with these arguments and returns its result. */
 #define EXPECT_CALL_OF(slot, call, ...) \
     EXPECT_EQ(recorder::callsOf(slot, [&] { return call; }), recorder::words(__VA_ARGS__)) << #call

@@ -4,7 +4,7 @@
 #include <cmpift.h>
 #include <cmpimacs.h>
 
-/* Each operation answers a code of its own, so that a test sees which one a slot holds. */
+/* Each operation returns a unique code, so that tests can identify the function in a slot. */
 
 static const CMPIBroker* broker;
 static int hookRuns;

@@ -3,8 +3,8 @@
 #include <cmpift.h>
 
 /**
- * Providers written in C with the stub macros: two providers in one file, one that serves all kinds
- * of interfaces and one that serves instances only.
+ * Two providers in one C file, written with the stub macros: one implements all interfaces, the other only the instance
+ * interface.
  */
 #ifdef __cplusplus
 extern "C" {
@@ -17,10 +17,13 @@ CMPIPropertyMI* Small_Create_PropertyMI(const CMPIBroker* broker, const CMPICont
 CMPIIndicationMI* Small_Create_IndicationMI(const CMPIBroker* broker, const CMPIContext* context, CMPIStatus* rc);
 CMPIInstanceMI* Smaller_Create_InstanceMI(const CMPIBroker* broker, const CMPIContext* context, CMPIStatus* rc);
 
-/** The broker that the latest factory was given. */
+/** Returns the broker that the latest factory call received. */
 const CMPIBroker* smallProvidersBroker(void);
 
-/** How often the hook of Smaller ran. It refuses, with a status, a factory call without a context. */
+/**
+ * Returns the number of calls of Smaller's hook. The hook sets an error status if the factory is called without a
+ * context.
+ */
 int smallerHookRuns(void);
 
 #ifdef __cplusplus

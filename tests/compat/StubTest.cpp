@@ -12,7 +12,7 @@ constexpr CMPIContext* noContext = nullptr;
 constexpr CMPIResult* noResult = nullptr;
 constexpr CMPIObjectPath* noPath = nullptr;
 
-TEST(Stub, GivesEveryInterfaceItsVersionAndName) {
+TEST(Stub, SetsVersionAndNameOfEveryInterface) {
     const CMPIBroker broker{};
     const auto expectHead = [](const auto* mi, const char* name) {
         EXPECT_EQ(mi->ft->ftVersion, CMPIVersion200);
@@ -27,7 +27,7 @@ TEST(Stub, GivesEveryInterfaceItsVersionAndName) {
     expectHead(Smaller_Create_InstanceMI(&broker, nullptr, nullptr), "instanceSmaller");
 }
 
-TEST(Stub, AnswersTheSameInterfaceAtEveryCallAndKeepsTheLatestBroker) {
+TEST(Stub, ReturnsTheSameInterfaceInEveryCallAndKeepsTheLatestBroker) {
     const CMPIBroker first{};
     const CMPIBroker second{};
     CMPIInstanceMI* const mi = Small_Create_InstanceMI(&first, nullptr, nullptr);
@@ -49,7 +49,7 @@ TEST(Stub, RunsTheHookWithTheArgumentsOfTheFactory) {
     EXPECT_EQ(smallerHookRuns(), before + 2);
 }
 
-TEST(Stub, PutsTheInstanceFunctionsIntoTheirSlots) {
+TEST(Stub, AssignsTheInstanceFunctions) {
     const CMPIBroker broker{};
     CMPIInstanceMI* const mi = Small_Create_InstanceMI(&broker, nullptr, nullptr);
     const CMPIInstanceMIFT& table = *mi->ft;
@@ -62,7 +62,7 @@ TEST(Stub, PutsTheInstanceFunctionsIntoTheirSlots) {
     EXPECT_EQ(table.execQuery(mi, noContext, noResult, noPath, "", "").rc, CMPI_RC_ERR_INVALID_QUERY);
 }
 
-TEST(Stub, PutsTheAssociationFunctionsIntoTheirSlots) {
+TEST(Stub, AssignsTheAssociationFunctions) {
     const CMPIBroker broker{};
     CMPIAssociationMI* const mi = Small_Create_AssociationMI(&broker, nullptr, nullptr);
     const CMPIAssociationMIFT& table = *mi->ft;
@@ -73,7 +73,7 @@ TEST(Stub, PutsTheAssociationFunctionsIntoTheirSlots) {
     EXPECT_EQ(table.referenceNames(mi, noContext, noResult, noPath, "", "").rc, CMPI_RC_ERR_INVALID_PARAMETER);
 }
 
-TEST(Stub, PutsTheMethodAndPropertyFunctionsIntoTheirSlots) {
+TEST(Stub, AssignsTheMethodAndPropertyFunctions) {
     const CMPIBroker broker{};
     CMPIMethodMI* const methods = Small_Create_MethodMI(&broker, nullptr, nullptr);
     EXPECT_EQ(methods->ft->cleanup(methods, noContext, 0).rc, CMPI_RC_OK);
@@ -89,7 +89,7 @@ TEST(Stub, PutsTheMethodAndPropertyFunctionsIntoTheirSlots) {
     EXPECT_EQ(properties->ft->setPropertyWithOrigin, nullptr);
 }
 
-TEST(Stub, PutsTheIndicationFunctionsIntoTheirSlots) {
+TEST(Stub, AssignsTheIndicationFunctions) {
     const CMPIBroker broker{};
     CMPIIndicationMI* const mi = Small_Create_IndicationMI(&broker, nullptr, nullptr);
     const CMPIIndicationMIFT& table = *mi->ft;
@@ -102,7 +102,7 @@ TEST(Stub, PutsTheIndicationFunctionsIntoTheirSlots) {
     EXPECT_EQ(table.disableIndications(mi, noContext).rc, CMPI_RC_ERR_FAILED);
 }
 
-// A broker that makes one instance, and the request that asks for it.
+// A broker that creates one instance, and a request for it.
 struct Request {
     bool keyIsThere = true;
     std::string log;
@@ -176,7 +176,7 @@ TEST_F(ProviderInC, ReturnsAnInstanceThroughTheTables) {
     EXPECT_EQ(request.log, "key Id\ninstance\nName=small\nreturned\ndone\n");
 }
 
-TEST_F(ProviderInC, AnswersAMessageWhenThereIsNoInstance) {
+TEST_F(ProviderInC, ReturnsAMessageIfThereIsNoInstance) {
     request.keyIsThere = false;
     const CMPIStatus status = mi->ft->getInstance(mi, noContext, &result, &path, nullptr);
     EXPECT_EQ(status.rc, CMPI_RC_ERR_NOT_FOUND);

@@ -6,9 +6,9 @@
 #include <set>
 #include <utility>
 
-#include "Course.h"
+#include "ExpectedOutcome.h"
 
-// The file of asset data belongs to the agent, which replaces it as a whole.
+// The agent owns the asset data file and replaces it atomically.
 
 namespace faults {
 namespace {
@@ -19,81 +19,81 @@ using testing::Pair;
 
 class AssetFaultTest : public testing::Test {
 protected:
-    AssetFaultTest() : request(requestNamed("ModifyAssetNumber")), course(undisturbed(scene, request)) {}
+    AssetFaultTest() : request(requestNamed("ModifyAssetNumber")), expected(runWithoutFaults(environment, request)) {}
 
-    fs::path file() const { return scene.dataDirectory() / assetFile; }
-    fs::path elsewhere() const { return scene.directory() / "elsewhere.dat"; }
+    fs::path file() const { return environment.dataDirectory() / assetFile; }
+    fs::path elsewhere() const { return environment.directory() / "elsewhere.dat"; }
 
-    /** The file is a link to one elsewhere, which only its owner may read. */
+    /** Replaces the file by a link to a file in another directory that only its owner can read. */
     void restartWithLink() {
-        scene.restart();
+        environment.restart();
         fs::remove(elsewhere());
         fs::rename(file(), elsewhere());
         fs::permissions(elsewhere(), fs::perms::owner_read | fs::perms::owner_write);
         fs::create_symlink(elsewhere(), file());
     }
 
-    /** What is left in the data directory beside the three files. */
+    /** Returns the files in the data directory except the three data files. */
     FileContents temporaryFiles() const {
-        FileContents files = scene.files();
-        for (const auto& each : scene.filesAtFirst()) {
+        FileContents files = environment.files();
+        for (const auto& each : environment.filesAtFirst()) {
             files.erase(each.first);
         }
         return files;
     }
 
-    Scene scene;
+    TestEnvironment environment;
     const Request& request;
-    const Course course;
+    const ExpectedOutcome expected;
 };
 
-TEST_F(AssetFaultTest, EveryFailureKeepsTheLinkToTheFileAndItsMode) {
+TEST_F(AssetFaultTest, EveryFailureKeepsTheSymbolicLinkAndTheMode) {
     restartWithLink();
-    const Counts counts = scene.ask(request).counts;
+    const Counts counts = environment.ask(request).counts;
     const auto failOne = [&](const Fault& fault) {
         restartWithLink();
-        scene.ask(request, &fault);
+        environment.ask(request, &fault);
         EXPECT_TRUE(fs::is_symlink(file()));
         EXPECT_EQ(fs::status(elsewhere()).permissions(), fs::perms::owner_read | fs::perms::owner_write);
-        expectAssetFile(course, fault, scene.files().at(assetFile));
+        expectAssetFile(expected, fault, environment.files().at(assetFile));
     };
     eachFault(counts, fileFailures(), failOne);
 }
 
-TEST_F(AssetFaultTest, AFullDiskKeepsTheFileAsItWas) {
+TEST_F(AssetFaultTest, AFullDiskKeepsTheFileUnchanged) {
     for (const Failure& failure :
          {Failure{operationWrite, ENOSPC}, Failure{operationSync, EIO}, Failure{operationRename, ENOSPC}}) {
         const Fault fault{failure.kind, 1, true, failure.error};
-        scene.restart();
-        scene.ask(request, &fault);
-        EXPECT_EQ(scene.files(), scene.filesAtFirst()) << fault;
+        environment.restart();
+        environment.ask(request, &fault);
+        EXPECT_EQ(environment.files(), environment.filesAtFirst()) << fault;
     }
 }
 
-TEST_F(AssetFaultTest, WhatCannotBeUndoneIsNoFailure) {
+TEST_F(AssetFaultTest, AFailureToSyncTheDirectoryIsIgnored) {
     const Fault fault{operationSync, 2, true, EIO};
-    scene.restart();
-    scene.ask(request, &fault);
-    EXPECT_EQ(scene.files().at(assetFile), course.fileAfter) << "the directory could not be forced to the disk";
+    environment.restart();
+    environment.ask(request, &fault);
+    EXPECT_EQ(environment.files().at(assetFile), expected.fileAfter) << "the directory could not be forced to the disk";
 }
 
-constexpr Extent everything{true, 100, true};
+constexpr FaultSelection everything{true, 100, true};
 
-/** docs/data-files.md tells which. */
-TEST_F(AssetFaultTest, OnlyAFileThatCouldNotBeReadLosesWhatWasNotGiven) {
+/** docs/data-files.md lists these operations. */
+TEST_F(AssetFaultTest, OnlyAnUnreadableFileLosesUnsetValues) {
     std::set<std::pair<OperationKind, int>> losing;
-    const std::string lost = assetWithFields(course, 0);
-    ASSERT_NE(lost, course.fileAfter);
+    const std::string lost = assetWithFields(expected, 0);
+    ASSERT_NE(lost, expected.fileAfter);
     const auto failOne = [&](const Fault& fault) {
-        scene.restart();
-        scene.ask(request, &fault);
-        if (scene.files().at(assetFile) == lost) {
+        environment.restart();
+        environment.ask(request, &fault);
+        if (environment.files().at(assetFile) == lost) {
             losing.emplace(fault.kind, fault.number);
         }
     };
-    eachFault(course.done.counts, fileFailures(), failOne, everything);
+    eachFault(expected.response.counts, fileFailures(), failOne, everything);
     int operations = 0;
-    for (const auto& each : onFiles(course.done.counts)) {
+    for (const auto& each : onFiles(expected.response.counts)) {
         operations += each.second;
     }
     EXPECT_EQ(operations, 25);
@@ -102,32 +102,32 @@ TEST_F(AssetFaultTest, OnlyAFileThatCouldNotBeReadLosesWhatWasNotGiven) {
         << "all that reading it takes, and nothing that writing it does";
 }
 
-/** What comes only after a failure fails too: taking back what was begun. */
-TEST_F(AssetFaultTest, ASecondFailureLeavesATemporaryFileAtMost) {
+/** The second fault hits operations that follow only after a failure, such as a rollback. */
+TEST_F(AssetFaultTest, ASecondFailureLeavesAtMostATemporaryFile) {
     int left = 0;
     const auto failTwice = [&](const Fault& first) {
         for (const Failure& second : fileFailures()) {
             if (second.error == EINTR) {
-                continue;  // again and again, it would be asked for again and again
+                continue;  // would be retried forever
             }
             Fault fault = first;
             fault.then = second;
             SCOPED_TRACE(testing::PrintToString(fault));
-            scene.restart();
-            const Done done = scene.ask(request, &fault);
-            EXPECT_EQ(done.outcome.rc, CMPI_RC_OK);
-            EXPECT_EQ(done.leftOpen, 0);
+            environment.restart();
+            const Response response = environment.ask(request, &fault);
+            EXPECT_EQ(response.outcome.rc, CMPI_RC_OK);
+            EXPECT_EQ(response.leakedDescriptors, 0);
             const auto temporary = temporaryFiles().size();
             EXPECT_LE(temporary, second.kind == operationRemove ? 1U : 0U);
             left += static_cast<int>(temporary);
-            expectAssetFile(course, fault, scene.files().at(assetFile));
+            expectAssetFile(expected, fault, environment.files().at(assetFile));
         }
     };
-    eachFault(course.done.counts, fileFailures(), failTwice, {false, 6});
+    eachFault(expected.response.counts, fileFailures(), failTwice, {false, 6});
     EXPECT_GT(left, 0);
 }
 
-/** Where a link is planted under the name of each file that is about to be made. */
+/** Target of the link that is created in place of each new file. */
 fs::path* plantedTarget = nullptr;
 
 void plant(const char* path) {
@@ -137,21 +137,21 @@ void plant(const char* path) {
     }
 }
 
-TEST_F(AssetFaultTest, ALinkPlantedForTheTemporaryFileIsNotFollowed) {
+TEST_F(AssetFaultTest, ASymbolicLinkInPlaceOfTheTemporaryFileIsNotFollowed) {
     fs::path target = elsewhere();
     testsupport::writeFile(target, "somebody else's");
-    scene.restart();
-    scene.library();
+    environment.restart();
+    environment.library();
     plantedTarget = &target;
-    setCreationWitness(&plant);
-    scene.ask(request);
-    setCreationWitness(nullptr);
+    setCreationObserver(&plant);
+    environment.ask(request);
+    setCreationObserver(nullptr);
     EXPECT_EQ(testsupport::readFile(target), "somebody else's");
-    EXPECT_EQ(scene.files().at(assetFile), course.fileAfter);
+    EXPECT_EQ(environment.files().at(assetFile), expected.fileAfter);
     EXPECT_FALSE(fs::is_symlink(file()));
     const FileContents planted = temporaryFiles();
     ASSERT_EQ(planted.size(), 1U) << "it was in the way";
-    EXPECT_TRUE(fs::is_symlink(scene.dataDirectory() / planted.begin()->first));
+    EXPECT_TRUE(fs::is_symlink(environment.dataDirectory() / planted.begin()->first));
 }
 
 }  // namespace

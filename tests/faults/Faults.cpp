@@ -24,29 +24,29 @@ constexpr std::array<const char*, operationKinds + 1> names{
     "renaming",   "removing",         "closing", "asking",  "owning",  "path resolving", "operation on files",
 };
 
-/** What this thread's faults are; nothing in here allocates. */
+/** The faults of this thread. The functions that use it do not allocate. */
 struct State {
     bool armed = false;
     const Fault* fault = nullptr;
     bool happened = false;
     std::array<int, operationKinds> counts{};
-    int onFiles = 0;  ///< all of them that are
+    int onFiles = 0;  ///< number of file operations
 };
 
 thread_local State state;
 
-/** Disarmed while what stands for a failure happens. */
-void happen(const std::function<void()>& event) {
+/** Runs an event that replaces a failure. Disables faults meanwhile. */
+void runDisarmed(const std::function<void()>& event) {
     state.armed = false;
     event();
     state.armed = true;
 }
 
-OperationVerdict failed(int error) {
+OperationFailure failed(int error) {
     return {error, error == 0 ? 1 : 0};
 }
 
-/** The next operation of a kind. @return its number, as the fault counts them; 0 when it is none of the fault's */
+/** Counts an operation of a kind. @return its number in the fault's count; 0 if the fault does not apply to the kind */
 int numberForFault(OperationKind kind) {
     const int number = ++state.counts[kind];
     state.onFiles += isOnFiles(kind) ? 1 : 0;
@@ -59,8 +59,8 @@ int numberForFault(OperationKind kind) {
     return state.fault->kind == kind ? number : 0;
 }
 
-OperationVerdict judge(OperationKind kind) {
-    constexpr OperationVerdict done{0, 0};
+OperationFailure injectFault(OperationKind kind) {
+    constexpr OperationFailure done{0, 0};
     if (!state.armed || testsupport::insideBroker != 0) {
         return done;
     }
@@ -74,22 +74,22 @@ OperationVerdict judge(OperationKind kind) {
     }
     state.happened = true;
     if (fault->instead) {
-        happen(fault->instead);
+        runDisarmed(fault->instead);
         return done;
     }
     return failed(fault->error);
 }
 
-/** Memory that is counted once, as an allocation. */
-void* take(std::size_t size) {
+/** Allocates memory without counting the call of malloc. */
+void* allocate(std::size_t size) {
     const bool wasArmed = std::exchange(state.armed, false);
     void* memory = std::malloc(size);
     state.armed = wasArmed;
     return memory;
 }
 
-/** Libraries take long to load under a sanitizer. */
-int operationsInTime() {
+/** Limits the number of operations with sanitizers, where libraries load slowly. */
+int maximumOperations() {
 #ifdef LAW_SANITIZE
     return 4;
 #else
@@ -97,7 +97,7 @@ int operationsInTime() {
 #endif
 }
 
-void tell(std::ostream& stream, int error) {
+void printError(std::ostream& stream, int error) {
     if (error != 0) {
         stream << ": " << std::generic_category().message(error);
     }
@@ -122,38 +122,38 @@ Counts onFiles(const Counts& counts) {
 
 std::ostream& operator<<(std::ostream& stream, const Fault& fault) {
     stream << nameOf(fault.kind) << " number " << fault.number << (fault.lasting ? " and all after it" : "");
-    tell(stream, fault.error);
+    printError(stream, fault.error);
     if (fault.then) {
         stream << ", then each " << nameOf(fault.then->kind);
-        tell(stream, fault.then->error);
+        printError(stream, fault.then->error);
     }
     return stream;
 }
 
-void Armed::begin() {
+void FaultInjection::begin() {
     state.counts = {};
     state.onFiles = 0;
     state.happened = false;
-    setOperationJudge(&judge);
+    setOperationHook(&injectFault);
     state.armed = true;
 }
 
-Armed::Armed(const Fault& fault) {
+FaultInjection::FaultInjection(const Fault& fault) {
     state.fault = &fault;
     begin();
 }
 
-Armed::Armed() {
+FaultInjection::FaultInjection() {
     state.fault = nullptr;
     begin();
 }
 
-Armed::~Armed() {
+FaultInjection::~FaultInjection() {
     state.armed = false;
     state.fault = nullptr;
 }
 
-Counts Armed::counts() const {
+Counts FaultInjection::counts() const {
     const bool wasArmed = std::exchange(state.armed, false);
     Counts counts;
     for (int kind = 0; kind < operationKinds; ++kind) {
@@ -185,13 +185,14 @@ std::vector<Failure> allFailures() {
 }
 
 void eachFault(const Counts& counts, const std::vector<Failure>& failures,
-               const std::function<void(const Fault&)>& body, const Extent& extent) {
-    const int most = extent.isKept ? extent.operations : std::min(extent.operations, operationsInTime());
+               const std::function<void(const Fault&)>& body, const FaultSelection& selection) {
+    const int most =
+        selection.withSanitizers ? selection.operations : std::min(selection.operations, maximumOperations());
     for (const Failure& failure : failures) {
         const int count = counts.at(failure.kind);
         const int step = 1 + (count - 1) / most;
         for (const bool lasting : {false, true}) {
-            const bool isLeftOut = lasting && (!extent.lasting || failure.error == EINTR);
+            const bool isLeftOut = lasting && (!selection.lasting || failure.error == EINTR);
             for (int number = 1; !isLeftOut && number <= count && !testing::Test::HasFailure(); number += step) {
                 const Fault fault{failure.kind, number, lasting, failure.error};
                 SCOPED_TRACE(testing::PrintToString(fault));
@@ -216,17 +217,17 @@ int openDescriptors() {
 
 }  // namespace faults
 
-// The libraries under test allocate with these too.
+// The libraries under test use these operators too.
 
 void* operator new(std::size_t size) {
-    const bool fails = faults::judge(operationAllocate).partly != 0;
-    if (void* memory = fails ? nullptr : faults::take(size)) {
+    const bool fails = faults::injectFault(operationAllocate).partly != 0;
+    if (void* memory = fails ? nullptr : faults::allocate(size)) {
         return memory;
     }
     throw std::bad_alloc();
 }
 
-// Sanitizers have one of their own, whose memory the operators below may not free.
+// Sanitizers replace this operator; the operators below could not free its memory.
 void* operator new(std::size_t size, const std::nothrow_t&) noexcept {
     try {
         return operator new(size);

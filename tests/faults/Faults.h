@@ -10,90 +10,92 @@
 
 #include "Operations.h"
 
-// Letting operations of the system and allocations fail, for a test, on its own thread. What the object manager that
-// the test plays does for the provider never fails, and is not counted.
+// Fault injection: lets system calls and allocations fail on the test's thread. Functions of the emulated object
+// manager never fail and are not counted.
 
 namespace faults {
 
-/** Names kinds as a person would. */
+/** Returns a readable name of a kind. */
 const char* nameOf(OperationKind kind);
 
-/** Whether operations of the kind are none that take memory. */
+/** Returns whether operations of the kind use files, rather than allocate memory. */
 bool isOnFiles(OperationKind kind);
 
-/** Stands for a kind: any that is on files. */
+/** Any kind that uses files. */
 constexpr OperationKind anyOnFiles = operationKinds;
 
-/** A kind of operations, and the errno value with which they fail; 0 fails allocations, and does others in part. */
+/**
+ * A kind of operation and the errno value of its failure. 0 makes an allocation fail and other operations succeed
+ * partially.
+ */
 struct Failure {
     OperationKind kind;
     int error;
 };
 
-/** Which operations fail, counted from 1 since the fault was armed, and how. */
+/** The operations that fail, counted from 1 since the injection began, and their failure. */
 struct Fault {
     OperationKind kind = operationAllocate;
     int number = 1;
-    bool lasting = false;  ///< all of the kind from that one on, instead of that one alone
-    int error = 0;         ///< as in Failure
+    bool lasting = false;  ///< fails all later operations of the kind, too
+    int error = 0;         ///< see Failure
 
-    /** What happens at that operation instead of a failure. */
+    /** Called at that operation instead of a failure. */
     std::function<void()> instead{};
 
-    /** What also fails, each time, once the fault has happened. */
+    /** A further failure of every operation of its kind after the first failure. */
     std::optional<Failure> then{};
 };
 
 std::ostream& operator<<(std::ostream& stream, const Fault& fault);
 
-/** How often each kind of operation came. */
+/** Number of operations per kind. */
 using Counts = std::map<OperationKind, int>;
 
-/** The counts of those kinds that are on files; kinds that did not come are left out. */
+/** Returns the nonzero counts of the kinds that use files. */
 Counts onFiles(const Counts& counts);
 
 /**
- * Faults happen, and operations are counted, on this thread while one of these lives; there is one at a time. Makes
- * nothing that allocates while it counts.
+ * Injects faults and counts operations on this thread while it exists. Only one instance may exist. Does not allocate.
  */
-class Armed {
+class FaultInjection {
 public:
-    explicit Armed(const Fault& fault);
-    Armed();  ///< counts only
-    ~Armed();
-    Armed(const Armed&) = delete;
-    Armed& operator=(const Armed&) = delete;
+    explicit FaultInjection(const Fault& fault);
+    FaultInjection();  ///< only counts operations
+    ~FaultInjection();
+    FaultInjection(const FaultInjection&) = delete;
+    FaultInjection& operator=(const FaultInjection&) = delete;
 
-    /** How often each kind of operation came until now. */
+    /** Returns the number of operations per kind so far. */
     Counts counts() const;
 
 private:
     void begin();
 };
 
-/** The ways in which each kind on files is let fail, and in which each that takes memory is. */
+/** Return the tested failures of the kinds that use files, or that allocate memory. */
 const std::vector<Failure>& fileFailures();
 const std::vector<Failure>& memoryFailures();
 std::vector<Failure> allFailures();
 
-/** Which of the possible faults are gone through. */
-struct Extent {
-    bool lasting = true;                               ///< each failure also with all of its kind after it
-    int operations = std::numeric_limits<int>::max();  ///< of each kind at most so many, evenly spread
-    bool isKept = false;                               ///< also where time allows for a few only
+/** Selects faults. */
+struct FaultSelection {
+    bool lasting = true;                               ///< also each failure with all later operations of the kind
+    int operations = std::numeric_limits<int>::max();  ///< maximum number of operations per kind, evenly spaced
+    bool withSanitizers = false;                       ///< also with sanitizers
 };
 
 /**
- * Goes through the faults of a request that comes with these counts: every failure of each operation. Ends when a test
- * has failed. A call that is interrupted may be made again and again, so that none is interrupted lastingly.
+ * Calls `body` with each fault of a request with these counts: every failure of each operation. Stops when the test
+ * fails. Omits lasting interruptions (EINTR), since interrupted calls may be retried forever.
  */
 void eachFault(const Counts& counts, const std::vector<Failure>& failures,
-               const std::function<void(const Fault&)>& body, const Extent& extent = {});
+               const std::function<void(const Fault&)>& body, const FaultSelection& selection = {});
 
-/** Goes through the operations on files as the moments at which something else may happen; the faults have no error. */
+/** Calls `body` for each operation on files as the time of another event. The faults have no error. */
 void eachMoment(const Counts& counts, const std::function<void(const Fault&)>& body);
 
-/** How many files this process has open. */
+/** Returns the number of open file descriptors of this process. */
 int openDescriptors();
 
 }  // namespace faults

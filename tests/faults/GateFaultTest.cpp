@@ -4,11 +4,11 @@
 #include <algorithm>
 #include <cerrno>
 
-#include "Course.h"
+#include "ExpectedOutcome.h"
 #include "Killing.h"
 
-// Changes through the gate while operations on files fail: an answer of success means that all is stored, and any other
-// that nothing has changed.
+// Changes through the gate while file operations fail: success means that everything is stored, any other status that
+// nothing changed.
 
 namespace faults {
 namespace {
@@ -21,8 +21,8 @@ using testing::Not;
 
 class GateFaultTest : public testing::TestWithParam<Request> {
 protected:
-    GateFaultTest() : scene(Scene::Library::gate), course(undisturbed(scene, request())) {
-        EXPECT_EQ(course.done.outcome.rc, CMPI_RC_OK) << course.done.outcome.message;
+    GateFaultTest() : environment(TestEnvironment::Library::gate), expected(runWithoutFaults(environment, request())) {
+        EXPECT_EQ(expected.response.outcome.rc, CMPI_RC_OK) << expected.response.outcome.message;
     }
 
     static const Request& request() { return GetParam(); }
@@ -33,85 +33,91 @@ protected:
         return lines;
     }
 
-    static bool isWhole(const std::string& content) {
+    static bool isComplete(const std::string& content) {
         return file() == assetFile ||
-               stateOf(content, file() == leaseFile ? linesOfLease : linesOfWarranty) == FileState::whole;
+               stateOf(content, file() == leaseFile ? linesOfLease : linesOfWarranty) == FileState::complete;
     }
 
-    Lines now() { return sorted(scene.instancesOf(classOf(file()))); }
+    Lines now() { return sorted(environment.instancesOf(classOf(file()))); }
 
     void failOne(const Fault& fault) {
-        scene.restart();
-        const Done done = scene.ask(request(), &fault);
-        EXPECT_FALSE(done.outcome.threw);
-        EXPECT_EQ(done.leftOpen, 0);
-        if (done.outcome.rc == CMPI_RC_OK) {
+        environment.restart();
+        const Response response = environment.ask(request(), &fault);
+        EXPECT_FALSE(response.outcome.threw);
+        EXPECT_EQ(response.leakedDescriptors, 0);
+        if (response.outcome.rc == CMPI_RC_OK) {
             expectStored();
         } else {
-            // For lack of memory, the provider may answer as if there were no such instance.
-            EXPECT_THAT(done.outcome.rc,
+            // If memory is short, the provider may respond as if the instance did not exist.
+            EXPECT_THAT(response.outcome.rc,
                         AnyOf(CMPI_RC_ERR_FAILED, isOnFiles(fault.kind) ? CMPI_RC_ERR_FAILED : CMPI_RC_ERR_NOT_FOUND));
-            EXPECT_THAT(done.outcome.message, Not(IsEmpty()));
-            expectTakenBack(fault, done.outcome.message);
+            EXPECT_THAT(response.outcome.message, Not(IsEmpty()));
+            expectRolledBack(fault, response.outcome.message);
         }
     }
 
     void expectStored() {
-        EXPECT_EQ(now(), sorted(course.after));
-        EXPECT_EQ(scene.files().at(file()), course.fileAfter);
+        EXPECT_EQ(now(), sorted(expected.after));
+        EXPECT_EQ(environment.files().at(file()), expected.fileAfter);
     }
 
-    /** Without the tag, which nobody may write, and which is lost where the provider could not read it in the middle.
+    /**
+     * Returns the instances without the asset tag, which clients cannot set. It is lost if the provider could read only
+     * a part of the file.
      */
     Lines withoutTag() const {
-        Lines lines = course.before;
+        Lines lines = expected.before;
         std::replace(lines.begin(), lines.end(), std::string("AssetIdTag=\"first value of AssetIdTag\""),
                      std::string("AssetIdTag=\"\""));
         return sorted(lines);
     }
 
-    /** What may be left of a change that failed: what was before, unless it is told that this may not be so. */
+    /**
+     * Returns the possible instances after a failed change: the instances before it, unless the message says that the
+     * file may have changed.
+     */
     std::vector<Lines> possible(const Fault& fault, const std::string& message) const {
         if (message.find("asset.dat may not be what it was before") == std::string::npos) {
-            return {sorted(course.before)};
+            return {sorted(expected.before)};
         }
-        if (fault.lasting) {  // it cannot be written again, or not be read
-            return {sorted(course.before), sorted(course.after)};
+        if (fault.lasting) {  // reading or writing may fail again
+            return {sorted(expected.before), sorted(expected.after)};
         }
-        EXPECT_TRUE(mayHinderReading(fault));
+        EXPECT_TRUE(mayPreventReading(fault));
         return isOnFiles(fault.kind) ? std::vector<Lines>{withoutTag()}
-                                     : std::vector<Lines>{sorted(course.before), withoutTag()};
+                                     : std::vector<Lines>{sorted(expected.before), withoutTag()};
     }
 
-    void expectTakenBack(const Fault& fault, const std::string& message) {
+    void expectRolledBack(const Fault& fault, const std::string& message) {
         const Lines kept = now();
         EXPECT_THAT(possible(fault, message), Contains(kept)) << message;
-        if (!isWhole(scene.files().at(file()))) {
+        if (!isComplete(environment.files().at(file()))) {
             EXPECT_TRUE(fault.lasting) << message;
             EXPECT_THAT(message, HasSubstr("stays damaged"));
         }
         if (fault.lasting && file() != assetFile) {
-            scene.ask(detourOf(file()));  // what was taken back could not be written either: a later change does it
-            scene.ask(repairOf(file()));
+            // The rollback was not written either; a later change writes it.
+            environment.ask(otherChangeOf(file()));
+            environment.ask(repairOf(file()));
         }
-        scene.unload();
+        environment.unload();
         EXPECT_EQ(now(), kept) << "after a restart";
     }
 
-    Scene scene;
-    const Course course;
+    TestEnvironment environment;
+    const ExpectedOutcome expected;
 };
 
 TEST_P(GateFaultTest, SuccessMeansStoredAndFailureMeansUnchanged) {
-    eachFault(course.done.counts, fileFailures(), [&](const Fault& fault) { failOne(fault); });
+    eachFault(expected.response.counts, fileFailures(), [&](const Fault& fault) { failOne(fault); });
 }
 
-constexpr Extent once{false};
+constexpr FaultSelection once{false};
 
-/** Once: what is taken back takes memory too. */
-TEST_P(GateFaultTest, SoTheyDoWhenMemoryIsRefusedOnce) {
+/** Fails one allocation only, since the rollback allocates too. */
+TEST_P(GateFaultTest, SuccessMeansStoredAndFailureMeansUnchangedIfOneAllocationFails) {
     eachFault(
-        course.done.counts, memoryFailures(), [&](const Fault& fault) { failOne(fault); }, once);
+        expected.response.counts, memoryFailures(), [&](const Fault& fault) { failOne(fault); }, once);
 }
 
 INSTANTIATE_TEST_SUITE_P(Requests, GateFaultTest, testing::ValuesIn(changingRequests()),

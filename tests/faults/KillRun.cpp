@@ -1,10 +1,11 @@
-// Kills processes that create, modify and delete, and tells what is left of their files.
+// Kills processes that create, modify and delete, and reports the state of their files.
 //
 // Usage: kill_run [--counted] KILLS [SEED]
-//   --counted  not at random moments, but after so many operations on files as the seed says: repeats exactly
+//   --counted  kills after a number of file operations that depends on the seed instead of at a random time, so that
+//              the run is reproducible
 //
-// Ends with status 1 when a promise was broken: asset data are always whole, and those of the last modification that
-// was answered or of the one under way; and the next process serves.
+// Exits with status 1 if asset.dat is incomplete, if it is neither that of the last successful modification nor of the
+// current one, or if the next process fails.
 
 #include <unistd.h>
 
@@ -30,15 +31,15 @@ using testsupport::text;
 using testsupport::uint32;
 
 constexpr int records = 10;
-constexpr int longestLife = 20000;    ///< microseconds after the first answer
-constexpr int mostOperations = 4000;  ///< on files, of a process whose operations are counted
+constexpr int maximumDelay = 20000;          ///< microseconds after the first response
+constexpr int maximumOperationCount = 4000;  ///< file operations of a process whose operations are counted
 
-/** The text that a step writes into two properties at once. */
-std::string textOf(int step) {
+/** Returns the value that a step writes to two properties. */
+std::string valueOf(int step) {
     return "written by step " + std::to_string(step);
 }
 
-/** A step of the load: asset data, a lease, a new warranty or its deletion, in turn. */
+/** Returns a step of the load: modifies asset data or a lease, creates a warranty or deletes it, in turn. */
 Request stepOf(int step) {
     const auto with = [](const char* request, const std::string& identifier, std::vector<cimhost::NamedValue> values) {
         Request made = requestNamed(request);
@@ -53,9 +54,9 @@ Request stepOf(int step) {
     switch (step % 4) {
         case 0:
             return with("ModifyAsset", "",
-                        {named("AssetNumber", text(textOf(step))), named("SystemLocation", text(textOf(step)))});
+                        {named("AssetNumber", text(valueOf(step))), named("SystemLocation", text(valueOf(step)))});
         case 1:
-            return with("ModifyLease", "lease number " + number, {named("Lessor", text(textOf(step)))});
+            return with("ModifyLease", "lease number " + number, {named("Lessor", text(valueOf(step)))});
         case 2:
             return with("CreateWarranty", "warranty of step " + std::to_string(step), {});
         default:
@@ -63,18 +64,18 @@ Request stepOf(int step) {
     }
 }
 
-/** What has been seen of a kind of files of records. */
-struct Seen {
-    int whole = 0;
+/** States of the record files of a class after kills. */
+struct FileStatistics {
+    int complete = 0;
     int empty = 0;
-    int cutOff = 0;
-    int recordsLost = 0;  ///< of all the files that are not whole, against those that had to be there
+    int truncated = 0;
+    int recordsLost = 0;  ///< in incomplete files
 
     void add(const std::string& content, int linesOfRecord) {
         const FileState state = stateOf(content, linesOfRecord);
-        ++(state == FileState::whole ? whole : state == FileState::empty ? empty : cutOff);
-        if (state != FileState::whole) {
-            recordsLost += records - std::min(records, wholeRecordsIn(content, linesOfRecord));
+        ++(state == FileState::complete ? complete : state == FileState::empty ? empty : truncated);
+        if (state != FileState::complete) {
+            recordsLost += records - std::min(records, completeRecordsIn(content, linesOfRecord));
         }
     }
 };
@@ -84,28 +85,28 @@ public:
     KillRun(bool countsOperations, unsigned int seed) : isCounted(countsOperations), random(seed) {}
 
     void killOnce() {
-        FileContents files = scene.filesAtFirst();
+        FileContents files = environment.filesAtFirst();
         files[leaseFile] = leaseRecords(records);
         files[warrantyFile] = warrantyRecords(records);
-        scene.restart(files);
+        environment.restart(files);
         const int answered = answeredUntilKilled();
-        const FileContents left = scene.files();
+        const FileContents left = environment.files();
         leases.add(left.at(leaseFile), linesOfLease);
         warranties.add(left.at(warrantyFile), linesOfWarranty);
         temporaries += static_cast<int>(left.size()) - 3;
-        lookAtAsset(left.at(assetFile), answered);
+        checkAsset(left.at(assetFile), answered);
         for (const char* file : {leaseFile, warrantyFile, assetFile}) {
-            require(scene.ask(repairOf(file)).outcome.rc == CMPI_RC_OK, "the next process does not serve");
+            require(environment.ask(repairOf(file)).outcome.rc == CMPI_RC_OK, "the next process does not serve");
         }
         ++kills;
     }
 
     bool report() const {
         std::cout << "kills                        " << kills << "\nsteps answered before them   " << steps
-                  << "\nasset.dat whole              " << assetsWhole << "\ntemporary files left         "
+                  << "\nasset.dat whole              " << assetsComplete << "\ntemporary files left         "
                   << temporaries << '\n';
-        tell("Lease.dat", leases);
-        tell("Warranty.dat", warranties);
+        print("Lease.dat", leases);
+        print("Warranty.dat", warranties);
         std::cout << "promises broken              " << broken << '\n';
         return broken == 0;
     }
@@ -113,34 +114,37 @@ public:
 private:
     int upTo(int most) { return std::uniform_int_distribution<int>(0, most)(random); }
 
-    /** The load, which tells each step that was answered. Kills itself after some operations, if there are any. */
-    void work(int told, int operations) {
+    /**
+     * Runs the load and writes the number of each completed step to the pipe. Kills itself after `operations` file
+     * operations, unless 0.
+     */
+    void work(int output, int operations) {
         for (int step = 0;; ++step) {
             const Fault killed{anyOnFiles, operations, false, 0, [] { std::raise(SIGKILL); }};
-            const Done done = scene.ask(stepOf(step), operations > 0 ? &killed : nullptr);
-            for (const auto& each : onFiles(done.counts)) {
+            const Response response = environment.ask(stepOf(step), operations > 0 ? &killed : nullptr);
+            for (const auto& each : onFiles(response.counts)) {
                 operations -= each.second;
             }
-            if (write(told, &step, sizeof step) != sizeof step) {
+            if (write(output, &step, sizeof step) != sizeof step) {
                 throw std::runtime_error("nobody listens");
             }
         }
     }
 
-    /** Runs the load in a process of its own until it is killed; the last step that was answered, -1 without one. */
+    /** Runs the load in a child process until it is killed. Returns the last completed step, or -1. */
     int answeredUntilKilled() {
         int pipe[2];
         if (::pipe(pipe) != 0) {
             throw std::runtime_error("no pipe");
         }
-        const int operations = isCounted ? 1 + upTo(mostOperations) : 0;
+        const int operations = isCounted ? 1 + upTo(maximumOperationCount) : 0;
         const pid_t child = startProcess([&] { work(pipe[1], operations); });
         close(pipe[1]);
         int last = -1;
         int step = 0;
         if (!isCounted && read(pipe[0], &step, sizeof step) == sizeof step) {
             last = step;
-            std::this_thread::sleep_for(std::chrono::microseconds(upTo(longestLife)));
+            std::this_thread::sleep_for(std::chrono::microseconds(upTo(maximumDelay)));
             kill(child, SIGKILL);
         }
         require(waitForEnd(child), "the load came to an end");
@@ -152,7 +156,9 @@ private:
         return last;
     }
 
-    /** The modifications whose content asset.dat may have: the last one answered, and the step under way, if it is one.
+    /**
+     * Returns the modifications that asset.dat may contain: the last completed one and the current step, if it modifies
+     * asset data.
      */
     static std::vector<int> possibleModifications(int answered) {
         std::vector<int> steps;
@@ -164,16 +170,16 @@ private:
         return steps;
     }
 
-    void lookAtAsset(const std::string& content, int answered) {
-        bool found = answered < 0 && content == scene.filesAtFirst().at(assetFile);
+    void checkAsset(const std::string& content, int answered) {
+        bool found = answered < 0 && content == environment.filesAtFirst().at(assetFile);
         for (const int step : possibleModifications(answered)) {
-            const std::string value = textOf(step) + "\n";
+            const std::string value = valueOf(step) + "\n";
             found = found || (content.find("USER.AssetNumber=" + value) != std::string::npos &&
                               content.find("USER.Location=" + value) != std::string::npos);
         }
         require(found && std::count(content.begin(), content.end(), '\n') == 21,
                 "asset.dat is none that it may be after step " + std::to_string(answered));
-        assetsWhole += found ? 1 : 0;
+        assetsComplete += found ? 1 : 0;
     }
 
     void require(bool kept, const std::string& what) {
@@ -183,20 +189,20 @@ private:
         }
     }
 
-    static void tell(const char* file, const Seen& seen) {
-        std::cout << file << ": whole " << seen.whole << ", empty " << seen.empty << ", cut off " << seen.cutOff
-                  << "; records lost in these " << seen.recordsLost << " of " << (seen.empty + seen.cutOff) * records
-                  << '\n';
+    static void print(const char* file, const FileStatistics& files) {
+        std::cout << file << ": whole " << files.complete << ", empty " << files.empty << ", cut off "
+                  << files.truncated << "; records lost in these " << files.recordsLost << " of "
+                  << (files.empty + files.truncated) * records << '\n';
     }
 
-    Scene scene;
+    TestEnvironment environment;
     bool isCounted;
     std::mt19937 random;
-    Seen leases;
-    Seen warranties;
+    FileStatistics leases;
+    FileStatistics warranties;
     int kills = 0;
     int steps = 0;
-    int assetsWhole = 0;
+    int assetsComplete = 0;
     int temporaries = 0;
     int broken = 0;
 };

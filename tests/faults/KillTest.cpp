@@ -7,7 +7,7 @@
 
 #include "Killing.h"
 
-// A process is killed before each of its operations in turn; another one then starts from the files.
+// Kills a process before each of its operations. The next process then loads the files.
 
 namespace faults {
 namespace {
@@ -22,21 +22,21 @@ protected:
     static std::string file() { return request().changes; }
 
     void restart() {
-        FileContents files = scene.filesAtFirst();
+        FileContents files = environment.filesAtFirst();
         files[leaseFile] = leaseRecords(records);
         files[warrantyFile] = warrantyRecords(records);
-        scene.restart(files);
-        before = scene.files();
+        environment.restart(files);
+        before = environment.files();
     }
 
-    /** Kills a process that makes the request, before one of its operations. */
+    /** Kills a process that makes the request before one of its operations. */
     void killBefore(OperationKind kind, int number) {
         restart();
         const Fault fault{kind, number, false, 0, [] { std::raise(SIGKILL); }};
-        EXPECT_TRUE(isKilled([&] { scene.ask(request(), &fault); }));
+        EXPECT_TRUE(isKilled([&] { environment.ask(request(), &fault); }));
     }
 
-    void expectWholeOrBeginning(const FileContents& left) {
+    void expectCompleteOrTruncated(const FileContents& left) {
         const std::string& content = left.at(file());
         if (file() == assetFile) {
             EXPECT_THAT(content, AnyOf(before.at(file()), whole.at(file())));
@@ -51,47 +51,47 @@ protected:
                                                           true)));
     }
 
-    Scene scene;
+    TestEnvironment environment;
     FileContents before;
     FileContents whole;
 };
 
-TEST_P(KillTest, EveryPointLeavesAssetDataWholeAndOfRecordsTheBeginningInWholeLines) {
+TEST_P(KillTest, EveryKillLeavesCompleteAssetDataAndOnlyCompleteLinesOfRecords) {
     restart();
-    const Counts counts = scene.ask(request()).counts;
-    whole = scene.files();
+    const Counts counts = environment.ask(request()).counts;
+    whole = environment.files();
     eachMoment(counts, [&](const Fault& moment) {
         killBefore(moment.kind, moment.number);
-        const FileContents left = scene.files();
+        const FileContents left = environment.files();
         for (const auto& [name, content] : before) {
             if (name != file()) {
                 EXPECT_EQ(left.at(name), content);
             }
         }
         EXPECT_LE(left.size(), before.size() + (file() == assetFile ? 1 : 0)) << "one temporary file at most";
-        expectWholeOrBeginning(left);
-        EXPECT_EQ(scene.ask(repairOf(file())).outcome.rc, CMPI_RC_OK) << "the next process serves";
-        EXPECT_EQ(scene.ask(request()).outcome.rc, CMPI_RC_OK);
+        expectCompleteOrTruncated(left);
+        EXPECT_EQ(environment.ask(repairOf(file())).outcome.rc, CMPI_RC_OK) << "the next process serves";
+        EXPECT_EQ(environment.ask(request()).outcome.rc, CMPI_RC_OK);
     });
 }
 
 INSTANTIATE_TEST_SUITE_P(Requests, KillTest, testing::ValuesIn(changingRequests()),
                          [](const auto& tested) { return tested.param.name; });
 
-TEST(KillProcessTest, EndsWithItsWork) {
+TEST(KillProcessTest, EndsWhenItsWorkReturns) {
     EXPECT_FALSE(isKilled([] {}));
     EXPECT_THROW(isKilled([] { throw std::runtime_error("on the way"); }), std::runtime_error);
 }
 
-TEST(KillStateTest, TellsWholeFilesFromOthers) {
-    EXPECT_EQ(stateOf(leaseRecords(3), linesOfLease), FileState::whole);
-    EXPECT_EQ(stateOf(warrantyRecords(3), linesOfWarranty), FileState::whole);
-    EXPECT_EQ(stateOf("0\n", linesOfLease), FileState::whole);
+TEST(KillStateTest, DistinguishesCompleteFiles) {
+    EXPECT_EQ(stateOf(leaseRecords(3), linesOfLease), FileState::complete);
+    EXPECT_EQ(stateOf(warrantyRecords(3), linesOfWarranty), FileState::complete);
+    EXPECT_EQ(stateOf("0\n", linesOfLease), FileState::complete);
     EXPECT_EQ(stateOf("", linesOfLease), FileState::empty);
     const std::string cut = leaseRecords(3).substr(0, leaseRecords(2).size() + 20);
-    EXPECT_EQ(stateOf(cut, linesOfLease), FileState::cutOff);
-    EXPECT_EQ(wholeRecordsIn(cut, linesOfLease), 2);
-    EXPECT_EQ(wholeRecordsIn("", linesOfLease), 0);
+    EXPECT_EQ(stateOf(cut, linesOfLease), FileState::truncated);
+    EXPECT_EQ(completeRecordsIn(cut, linesOfLease), 2);
+    EXPECT_EQ(completeRecordsIn("", linesOfLease), 0);
 }
 
 }  // namespace

@@ -22,12 +22,12 @@ FileState stateOf(const std::string& content, int linesOfRecord) {
     if (content.empty()) {
         return FileState::empty;
     }
-    const int promised = std::atoi(content.c_str());
-    const bool isWhole = content.back() == '\n' && linesIn(content) == 1 + promised * linesOfRecord;
-    return isWhole ? FileState::whole : FileState::cutOff;
+    const int declared = std::atoi(content.c_str());
+    const bool isComplete = content.back() == '\n' && linesIn(content) == 1 + declared * linesOfRecord;
+    return isComplete ? FileState::complete : FileState::truncated;
 }
 
-int wholeRecordsIn(const std::string& content, int linesOfRecord) {
+int completeRecordsIn(const std::string& content, int linesOfRecord) {
     return std::max(0, linesIn(content) - 1) / linesOfRecord;
 }
 

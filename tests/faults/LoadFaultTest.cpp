@@ -6,10 +6,10 @@
 #include <map>
 #include <utility>
 
-#include "Scene.h"
+#include "TestEnvironment.h"
 
-// Operations and allocations fail while the library is loaded: the agent reads its configuration then, the provider its
-// files of records. Without the configuration the data directory is another one, where no files are.
+// Operations and allocations fail while the library is loaded. The agent then reads its configuration and the provider
+// its record files. Without the configuration, the agent uses another data directory, which has no files.
 
 namespace faults {
 namespace {
@@ -22,32 +22,32 @@ using testing::Pair;
 
 class LoadFaultTest : public testing::Test {
 protected:
-    LoadFaultTest() : files(scene.filesAtFirst()) {}
+    LoadFaultTest() : files(environment.filesAtFirst()) {}
 
-    /** Loads the library anew, which then stays, and looks at what it has. */
+    /** Loads the library with a fault, keeps it loaded, and reads its records. */
     Counts load(const Fault* fault) {
-        scene.restart(files);
+        environment.restart(files);
         const int openBefore = openDescriptors();
-        const std::string file = fileOf(Scene::Library::provider);
+        const std::string file = fileOf(TestEnvironment::Library::provider);
         void* handle = nullptr;
         Counts counts;
         {
-            const Armed armed = fault == nullptr ? Armed() : Armed(*fault);
+            const FaultInjection injection = fault == nullptr ? FaultInjection() : FaultInjection(*fault);
             try {
                 handle = dlopen(file.c_str(), RTLD_NOW | RTLD_LOCAL);
             } catch (...) {
                 ADD_FAILURE() << "an exception left the library's loading";
             }
-            counts = armed.counts();
+            counts = injection.counts();
         }
         EXPECT_NE(handle, nullptr);
         EXPECT_EQ(openDescriptors(), openBefore);
-        scene.library();
+        environment.library();
         if (handle != nullptr) {
             dlclose(handle);
         }
-        leases = scene.instancesOf("VELKO_Lease");
-        warranties = scene.instancesOf("VELKO_Warranty");
+        leases = environment.instancesOf("VELKO_Lease");
+        warranties = environment.instancesOf("VELKO_Warranty");
         return counts;
     }
 
@@ -56,45 +56,48 @@ protected:
         files[warrantyFile] = warrantyRecords(180);
     }
 
-    /** All records or none of each class, whatever fails; all if what fails is only to be done again. */
-    void failEach(const std::vector<Failure>& failures, const Extent& extent) {
+    /**
+     * Expects all or no records of each class after each fault, and all records if a failed call is only to be
+     * repeated.
+     */
+    void failEach(const std::vector<Failure>& failures, const FaultSelection& selection) {
         const Counts counts = load(nullptr);
         const Lines allLeases = leases;
         const Lines allWarranties = warranties;
         ASSERT_FALSE(allLeases.empty() || allWarranties.empty());
         const auto failOne = [&](const Fault& fault) {
             load(&fault);
-            const bool isToBeDoneAgain = isOnFiles(fault.kind) && (fault.error == EINTR || fault.error == 0);
-            if (isToBeDoneAgain) {
+            const bool isRetried = isOnFiles(fault.kind) && (fault.error == EINTR || fault.error == 0);
+            if (isRetried) {
                 EXPECT_EQ(leases, allLeases);
                 EXPECT_EQ(warranties, allWarranties);
             }
             EXPECT_THAT(leases, AnyOf(allLeases, IsEmpty()));
             EXPECT_THAT(warranties, AnyOf(allWarranties, IsEmpty()));
-            EXPECT_EQ(scene.files(), files);
+            EXPECT_EQ(environment.files(), files);
             ++left[{!leases.empty(), !warranties.empty()}];
         };
-        eachFault(counts, failures, failOne, extent);
+        eachFault(counts, failures, failOne, selection);
     }
 
-    Scene scene;
+    TestEnvironment environment;
     FileContents files;
     Lines leases;
     Lines warranties;
-    std::map<std::pair<bool, bool>, int> left;  ///< how often there were leases and warranties after a fault
+    std::map<std::pair<bool, bool>, int> left;  ///< number of faults after which there were leases and warranties
 };
 
-TEST_F(LoadFaultTest, WithoutMemoryTheLibraryIsLoadedAndHasAllRecordsOrNone) {
-    failEach({{operationAllocate, 0}}, {});  // what the dynamic linker takes by malloc is not the library's
+TEST_F(LoadFaultTest, TheLibraryLoadsAllRecordsOrNoneIfAllocationsFail) {
+    failEach({{operationAllocate, 0}}, {});  // malloc is called only by the dynamic linker
 }
 
-/** Fields that are not read count as missing: a failure must not be taken for the end of the file. */
-TEST_F(LoadFaultTest, WithoutFilesTheLibraryIsLoadedAndHasAllRecordsOrNoneInsteadOfCopies) {
+/** Fields that are not read count as missing: the library must not mistake a failure for the end of the file. */
+TEST_F(LoadFaultTest, TheLibraryLoadsAllRecordsOrNoneIfFileOperationsFail) {
     makeFilesOfSeveralReads();
     failEach(fileFailures(), {});
 }
 
-TEST_F(LoadFaultTest, EachReadThatFailsCostsItsOwnFileOnly) {
+TEST_F(LoadFaultTest, AFailedReadAffectsOnlyItsFile) {
     makeFilesOfSeveralReads();
     failEach({{operationRead, EIO}}, {false, 100, true});
     EXPECT_THAT(left, ElementsAre(Pair(Pair(false, false), 2), Pair(Pair(false, true), Gt(1)),

@@ -4,11 +4,11 @@
 
 #include <filesystem>
 
-#include "Scene.h"
+#include "TestEnvironment.h"
 #include "support/FullDisk.h"
 #include "support/Umask.h"
 
-// A log that cannot be written costs its records, never a request.
+// A log that cannot be written loses records but never fails a request.
 
 namespace faults {
 namespace {
@@ -18,66 +18,66 @@ using testing::AnyOf;
 
 class LogFaultTest : public testing::Test {
 protected:
-    LogFaultTest() : log(scene.directory() / "agent.log") { configure(log); }
+    LogFaultTest() : log(environment.directory() / "agent.log") { configure(log); }
 
     void configure(const fs::path& destination) {
-        scene.configure("destination = \"" + destination.string() + "\"\nlog_level = 9999\ntrace_level = 9999\n" +
-                        "rotation_size = 12288\nrotation_count = 2");
+        environment.configure("destination = \"" + destination.string() + "\"\nlog_level = 9999\ntrace_level = 9999\n" +
+                              "rotation_size = 12288\nrotation_count = 2");
     }
 
     void removeLogs() const {
         for (const char* name : {"agent.log", "agent.1.log", "agent.2.log"}) {
-            fs::remove(scene.directory() / name);
+            fs::remove(environment.directory() / name);
         }
     }
 
-    /** Every request that changes something does as it would without a log. */
-    void expectChangesAsWithout() {
+    /** Expects that every changing request has the same result as without a log. */
+    void expectChangesAsWithoutLog() {
         for (const Request& request : changingRequests()) {
             SCOPED_TRACE(request.name);
-            scene.unload();
-            Scene without;
+            environment.unload();
+            TestEnvironment without;
             without.ask(request);
             without.unload();
-            scene.restart();
-            setenv("OSTREL_CONFIG", scene.configuration().c_str(), 1);
-            EXPECT_EQ(scene.ask(request).outcome.rc, CMPI_RC_OK);
-            EXPECT_EQ(scene.files(), without.files());
+            environment.restart();
+            setenv("OSTREL_CONFIG", environment.configuration().c_str(), 1);
+            EXPECT_EQ(environment.ask(request).outcome.rc, CMPI_RC_OK);
+            EXPECT_EQ(environment.files(), without.files());
         }
     }
 
-    /** The log's files, rotated ones too, are for nobody but their owner and group; nothing else was made for them. */
+    /** Expects that only owner and group can access the log files, including rotated ones. */
     void expectOwnFilesOnly() const {
-        for (const auto& entry : fs::directory_iterator(scene.directory())) {
+        for (const auto& entry : fs::directory_iterator(environment.directory())) {
             const std::string name = entry.path().filename();
-            if (name.rfind("agent.", 0) == 0 && entry.path() != scene.configuration()) {
+            if (name.rfind("agent.", 0) == 0 && entry.path() != environment.configuration()) {
                 EXPECT_EQ(entry.status().permissions() & ~ownersAndGroups, fs::perms::none) << name;
             }
         }
     }
 
     static constexpr fs::perms ownersAndGroups = fs::perms::owner_read | fs::perms::owner_write | fs::perms::group_read;
-    const testsupport::Umask none{0};  // the log itself has to see to its mode
-    Scene scene;
+    const testsupport::Umask none{0};  // the log must set its file mode itself
+    TestEnvironment environment;
     fs::path log;
 };
 
-TEST_F(LogFaultTest, AllThatFailsWithTheLogLeavesTheRequestServed) {
+TEST_F(LogFaultTest, FailuresOfTheLogDoNotFailTheRequest) {
     const Request& request = requestNamed("DeleteWarranty");
-    scene.restart();
-    const Counts counts = scene.ask(request).counts;
-    const std::string before = scene.filesAtFirst().at(warrantyFile);
-    const std::string after = scene.files().at(warrantyFile);
+    environment.restart();
+    const Counts counts = environment.ask(request).counts;
+    const std::string before = environment.filesAtFirst().at(warrantyFile);
+    const std::string after = environment.files().at(warrantyFile);
     ASSERT_GT(counts.at(operationRename), 0) << "the log is rotated";
     const auto failOne = [&](const Fault& fault) {
-        scene.restart();
+        environment.restart();
         const int openBefore = openDescriptors();
-        const Done done = scene.ask(request, &fault);
-        EXPECT_EQ(done.outcome.rc, CMPI_RC_OK);
-        EXPECT_FALSE(done.outcome.threw);
-        scene.ask(repairOf(warrantyFile));
-        EXPECT_THAT(scene.files().at(warrantyFile), AnyOf(before, after));
-        scene.unload();
+        const Response response = environment.ask(request, &fault);
+        EXPECT_EQ(response.outcome.rc, CMPI_RC_OK);
+        EXPECT_FALSE(response.outcome.threw);
+        environment.ask(repairOf(warrantyFile));
+        EXPECT_THAT(environment.files().at(warrantyFile), AnyOf(before, after));
+        environment.unload();
         EXPECT_EQ(openDescriptors(), openBefore);
         expectOwnFilesOnly();
         removeLogs();
@@ -85,67 +85,67 @@ TEST_F(LogFaultTest, AllThatFailsWithTheLogLeavesTheRequestServed) {
     eachFault(counts, allFailures(), failOne);
 }
 
-TEST_F(LogFaultTest, ALogWhoseDirectoryGoesAtARotationIsDoneWithoutAndNobodyMakesTheDirectory) {
-    const fs::path directory = scene.directory() / "log";
-    const fs::path away = scene.directory() / "away";
+TEST_F(LogFaultTest, ADirectoryThatIsRemovedDuringRotationIsNotCreatedAgain) {
+    const fs::path directory = environment.directory() / "log";
+    const fs::path away = environment.directory() / "away";
     fs::create_directory(directory);
     configure(directory / "agent.log");
     const Request& request = requestNamed("DeleteWarranty");
-    const Counts counts = scene.ask(request).counts;
+    const Counts counts = environment.ask(request).counts;
     ASSERT_GT(counts.at(operationRename), 0) << "the log is rotated";
     for (int number = 1; number <= counts.at(operationRename); ++number) {
         SCOPED_TRACE(number);
-        scene.restart();
+        environment.restart();
         const Fault vanishing{operationRename, number, false, 0, [&] { fs::rename(directory, away); }};
-        EXPECT_EQ(scene.ask(request, &vanishing).outcome.rc, CMPI_RC_OK);
+        EXPECT_EQ(environment.ask(request, &vanishing).outcome.rc, CMPI_RC_OK);
         EXPECT_FALSE(fs::exists(directory));
-        scene.unload();
+        environment.unload();
         fs::remove_all(directory);
         fs::remove_all(away);
         fs::create_directory(directory);
     }
 }
 
-/** Opening it would wait for its reader. */
-TEST_F(LogFaultTest, APipeInTheLogsPlaceIsNotOpenedAtARotation) {
+/** Opening the pipe would wait for a reader. */
+TEST_F(LogFaultTest, APipeInPlaceOfTheLogIsNotOpenedDuringRotation) {
     const Request& request = requestNamed("DeleteWarranty");
     const Fault planting{operationOpen, 1, false, 0, [&] {
                              EXPECT_FALSE(fs::exists(log)) << "the full one has been renamed";
                              EXPECT_EQ(mkfifo(log.c_str(), 0600), 0);
                          }};
-    EXPECT_EQ(scene.ask(request, &planting).outcome.rc, CMPI_RC_OK);
+    EXPECT_EQ(environment.ask(request, &planting).outcome.rc, CMPI_RC_OK);
     EXPECT_TRUE(fs::is_fifo(log));
 }
 
-TEST_F(LogFaultTest, ALogInADirectoryThatIsNotThereIsDoneWithout) {
-    configure(scene.directory() / "missing" / "agent.log");
-    expectChangesAsWithout();
+TEST_F(LogFaultTest, RequestsAreServedIfTheDirectoryOfTheLogIsMissing) {
+    configure(environment.directory() / "missing" / "agent.log");
+    expectChangesAsWithoutLog();
 }
 
-TEST_F(LogFaultTest, ALogThatIsADirectoryIsDoneWithout) {
+TEST_F(LogFaultTest, RequestsAreServedIfTheLogIsADirectory) {
     fs::create_directory(log);
-    expectChangesAsWithout();
+    expectChangesAsWithoutLog();
 }
 
-TEST_F(LogFaultTest, ALogThatCannotGrowIsDoneWithout) {
+TEST_F(LogFaultTest, RequestsAreServedIfTheLogCannotGrow) {
     constexpr rlim_t full = 1U << 20U;
-    scene.configure("destination = \"" + log.string() + "\"\nlog_level = 9999\ntrace_level = 9999\n");
+    environment.configure("destination = \"" + log.string() + "\"\nlog_level = 9999\ntrace_level = 9999\n");
     testsupport::writeFile(log, "");
     fs::resize_file(log, full);
     {
         const testsupport::FullDisk disk(full);
-        expectChangesAsWithout();
+        expectChangesAsWithoutLog();
     }
     EXPECT_EQ(fs::file_size(log), full);
 }
 
-TEST_F(LogFaultTest, ALogThatGoesBetweenTwoRequestsIsDoneWithout) {
-    scene.restart();
-    scene.ask(requestNamed("Leases"));
+TEST_F(LogFaultTest, RequestsAreServedIfTheLogIsRemovedBetweenThem) {
+    environment.restart();
+    environment.ask(requestNamed("Leases"));
     fs::remove(log);
     fs::create_directory(log);
-    EXPECT_EQ(scene.ask(requestNamed("DeleteLease")).outcome.rc, CMPI_RC_OK);
-    EXPECT_EQ(scene.files().at(leaseFile).substr(0, 2), "1\n");
+    EXPECT_EQ(environment.ask(requestNamed("DeleteLease")).outcome.rc, CMPI_RC_OK);
+    EXPECT_EQ(environment.files().at(leaseFile).substr(0, 2), "1\n");
 }
 
 }  // namespace

@@ -16,75 +16,75 @@
 
 #define VISIBLE __attribute__((visibility("default")))
 
-static OperationJudge currentJudge;
-static CreationWitness currentWitness;
+static OperationHook currentHook;
+static CreationObserver currentObserver;
 static const char* absentDirectory;
 
-void setOperationJudge(OperationJudge judge) {
-    __atomic_store_n(&currentJudge, judge, __ATOMIC_SEQ_CST);
+void setOperationHook(OperationHook hook) {
+    __atomic_store_n(&currentHook, hook, __ATOMIC_SEQ_CST);
 }
 
-void setCreationWitness(CreationWitness witness) {
-    __atomic_store_n(&currentWitness, witness, __ATOMIC_SEQ_CST);
+void setCreationObserver(CreationObserver observer) {
+    __atomic_store_n(&currentObserver, observer, __ATOMIC_SEQ_CST);
 }
 
 void setAbsentDirectory(const char* beginning) {
     __atomic_store_n(&absentDirectory, beginning, __ATOMIC_SEQ_CST);
 }
 
-static struct OperationVerdict verdictOn(enum OperationKind kind) {
-    const struct OperationVerdict done = {0, 0};
-    const OperationJudge judge = __atomic_load_n(&currentJudge, __ATOMIC_SEQ_CST);
-    return judge == NULL ? done : judge(kind);
+static struct OperationFailure failureOf(enum OperationKind kind) {
+    const struct OperationFailure done = {0, 0};
+    const OperationHook hook = __atomic_load_n(&currentHook, __ATOMIC_SEQ_CST);
+    return hook == NULL ? done : hook(kind);
 }
 
-static struct OperationVerdict verdictOnPath(enum OperationKind kind, const char* path) {
-    struct OperationVerdict verdict = verdictOn(kind);
+static struct OperationFailure failureOfPath(enum OperationKind kind, const char* path) {
+    struct OperationFailure failure = failureOf(kind);
     const char* absent = __atomic_load_n(&absentDirectory, __ATOMIC_SEQ_CST);
-    if (verdict.error == 0 && absent != NULL && strncmp(path, absent, strlen(absent)) == 0) {
-        verdict.error = ENOENT;
+    if (failure.error == 0 && absent != NULL && strncmp(path, absent, strlen(absent)) == 0) {
+        failure.error = ENOENT;
     }
-    return verdict;
+    return failure;
 }
 
-static void tellOfCreation(const char* path) {
-    const CreationWitness witness = __atomic_load_n(&currentWitness, __ATOMIC_SEQ_CST);
-    if (witness != NULL) {
-        witness(path);
+static void notifyObserver(const char* path) {
+    const CreationObserver observer = __atomic_load_n(&currentObserver, __ATOMIC_SEQ_CST);
+    if (observer != NULL) {
+        observer(path);
     }
 }
 
-/** The function of that name behind this library. */
+/** The next definition of the function after this library's. */
 #define NEXT(name) (__extension__(__typeof__(&name)) dlsym(RTLD_NEXT, #name))
 
-/** A function that fails as a whole or is passed on. */
-#define STAND_WITH(judgement, failed, result, name, parameters, arguments) \
-    VISIBLE result name parameters {                                       \
-        const struct OperationVerdict verdict = judgement;                 \
-        if (verdict.error != 0) {                                          \
-            errno = verdict.error;                                         \
-            return failed;                                                 \
-        }                                                                  \
-        return NEXT(name) arguments;                                       \
+/** Defines a function that fails or calls the next definition. */
+#define INTERPOSE_WITH(lookup, failed, result, name, parameters, arguments) \
+    VISIBLE result name parameters {                                        \
+        const struct OperationFailure failure = lookup;                     \
+        if (failure.error != 0) {                                           \
+            errno = failure.error;                                          \
+            return failed;                                                  \
+        }                                                                   \
+        return NEXT(name) arguments;                                        \
     }
-#define STAND_BEFORE(kind, failed, result, name, parameters, arguments) \
-    STAND_WITH(verdictOn(kind), failed, result, name, parameters, arguments)
-#define STAND_BEFORE_PATH(kind, failed, result, name, parameters, arguments) \
-    STAND_WITH(verdictOnPath(kind, path), failed, result, name, parameters, arguments)
+#define INTERPOSE(kind, failed, result, name, parameters, arguments) \
+    INTERPOSE_WITH(failureOf(kind), failed, result, name, parameters, arguments)
+#define INTERPOSE_PATH(kind, failed, result, name, parameters, arguments) \
+    INTERPOSE_WITH(failureOfPath(kind, path), failed, result, name, parameters, arguments)
 
-/** One that closes: a failure is told after it. */
-#define STAND_BEFORE_CLOSING(name, parameters, arguments)                  \
+/** Defines a function that closes: it closes the file even if it reports a failure. */
+#define INTERPOSE_CLOSE(name, parameters, arguments)                       \
     VISIBLE int name parameters {                                          \
-        const struct OperationVerdict verdict = verdictOn(operationClose); \
+        const struct OperationFailure failure = failureOf(operationClose); \
         const int result = NEXT(name) arguments;                           \
-        if (verdict.error != 0) {                                          \
-            errno = verdict.error;                                         \
+        if (failure.error != 0) {                                          \
+            errno = failure.error;                                         \
         }                                                                  \
-        return verdict.error != 0 ? -1 : result;                           \
+        return failure.error != 0 ? -1 : result;                           \
     }
 
-/** One whose last parameter, the mode of a new file, is there only if the flags ask for one. */
-#define STAND_BEFORE_OPENING(name, parameters, first)                               \
+/** Defines a function whose last parameter, the mode of a new file, is present only if the flags require it. */
+#define INTERPOSE_OPEN(name, parameters, first)                                     \
     VISIBLE int name parameters {                                                   \
         mode_t mode = 0;                                                            \
         if ((flags & (O_CREAT | __O_TMPFILE)) != 0) {                               \
@@ -93,66 +93,66 @@ static void tellOfCreation(const char* path) {
             mode = va_arg(rest, mode_t);                                            \
             va_end(rest);                                                           \
         }                                                                           \
-        const struct OperationVerdict verdict = verdictOnPath(operationOpen, path); \
-        if (verdict.error != 0) {                                                   \
-            errno = verdict.error;                                                  \
+        const struct OperationFailure failure = failureOfPath(operationOpen, path); \
+        if (failure.error != 0) {                                                   \
+            errno = failure.error;                                                  \
             return -1;                                                              \
         }                                                                           \
         if ((flags & O_CREAT) != 0) {                                               \
-            tellOfCreation(path);                                                   \
+            notifyObserver(path);                                                   \
         }                                                                           \
         return NEXT(name)(first, flags, mode);                                      \
     }
 
-/** One that may be done in part. */
-#define STAND_BEFORE_TRANSFER(kind, failed, result, name, parameters, amount, arguments) \
-    VISIBLE result name parameters {                                                     \
-        const struct OperationVerdict verdict = verdictOn(kind);                         \
-        if (verdict.error != 0) {                                                        \
-            errno = verdict.error;                                                       \
-            return failed;                                                               \
-        }                                                                                \
-        if (verdict.partly && amount > 1) {                                              \
-            amount /= 2;                                                                 \
-        }                                                                                \
-        return NEXT(name) arguments;                                                     \
+/** Defines a function that can succeed partially. */
+#define INTERPOSE_TRANSFER(kind, failed, result, name, parameters, amount, arguments) \
+    VISIBLE result name parameters {                                                  \
+        const struct OperationFailure failure = failureOf(kind);                      \
+        if (failure.error != 0) {                                                     \
+            errno = failure.error;                                                    \
+            return failed;                                                            \
+        }                                                                             \
+        if (failure.partly && amount > 1) {                                           \
+            amount /= 2;                                                              \
+        }                                                                             \
+        return NEXT(name) arguments;                                                  \
     }
 
-/** One that opens by a mode in letters. */
-#define STAND_BEFORE_STREAM(name)                                                   \
+/** Defines a function that opens a stream with a mode string. */
+#define INTERPOSE_STREAM_OPEN(name)                                                 \
     VISIBLE FILE* name(const char* path, const char* mode) {                        \
-        const struct OperationVerdict verdict = verdictOnPath(operationOpen, path); \
-        if (verdict.error != 0) {                                                   \
-            errno = verdict.error;                                                  \
+        const struct OperationFailure failure = failureOfPath(operationOpen, path); \
+        if (failure.error != 0) {                                                   \
+            errno = failure.error;                                                  \
             return NULL;                                                            \
         }                                                                           \
         if (mode[0] != 'r') {                                                       \
-            tellOfCreation(path);                                                   \
+            notifyObserver(path);                                                   \
         }                                                                           \
         return NEXT(name)(path, mode);                                              \
     }
 
-/** One that makes a temporary file. While somebody is told of it, its first name is no secret. */
-#define STAND_BEFORE_TEMPORARY(name)                                                   \
+/** Defines a function that creates a temporary file. If there is an observer, the first name is predictable. */
+#define INTERPOSE_TEMPORARY(name)                                                      \
     VISIBLE int name(char* pattern, int flags) {                                       \
-        const struct OperationVerdict verdict = verdictOnPath(operationOpen, pattern); \
-        if (verdict.error != 0) {                                                      \
-            errno = verdict.error;                                                     \
+        const struct OperationFailure failure = failureOfPath(operationOpen, pattern); \
+        if (failure.error != 0) {                                                      \
+            errno = failure.error;                                                     \
             return -1;                                                                 \
         }                                                                              \
-        const int file = foreseenTemporary(pattern, flags);                            \
+        const int file = predictableTemporary(pattern, flags);                         \
         return file >= 0 ? file : NEXT(name)(pattern, flags);                          \
     }
 
-/** As mkostemp would make it, had it come upon this name first; negative when that name is taken. */
-static int foreseenTemporary(char* pattern, int flags) {
+/** Creates a temporary file like mkostemp, with a fixed name; returns a negative value if the name exists. */
+static int predictableTemporary(char* pattern, int flags) {
     const size_t length = strlen(pattern);
-    if (__atomic_load_n(&currentWitness, __ATOMIC_SEQ_CST) == NULL || length < 6) {
+    if (__atomic_load_n(&currentObserver, __ATOMIC_SEQ_CST) == NULL || length < 6) {
         return -1;
     }
     char* const varying = pattern + length - 6;
     memcpy(varying, "abcdef", 6);
-    tellOfCreation(pattern);
+    notifyObserver(pattern);
     const int file = NEXT(open)(pattern, O_RDWR | O_CREAT | O_EXCL | flags, 0600);
     if (file < 0) {
         memcpy(varying, "XXXXXX", 6);
@@ -160,13 +160,13 @@ static int foreseenTemporary(char* pattern, int flags) {
     return file;
 }
 
-/** One that takes memory; found once, since looking for a function may take some itself. */
-#define STAND_BEFORE_MEMORY(name, parameters, arguments)                        \
+/** Defines a function that allocates memory. Looks up the next definition once, since dlsym may allocate. */
+#define INTERPOSE_ALLOCATION(name, parameters, arguments)                       \
     VISIBLE void* name parameters {                                             \
         static __typeof__(&name) next;                                          \
-        const struct OperationVerdict verdict = verdictOn(operationTakeMemory); \
-        if (verdict.error != 0) {                                               \
-            errno = verdict.error;                                              \
+        const struct OperationFailure failure = failureOf(operationTakeMemory); \
+        if (failure.error != 0) {                                               \
+            errno = failure.error;                                              \
             return NULL;                                                        \
         }                                                                       \
         if (__atomic_load_n(&next, __ATOMIC_RELAXED) == NULL) {                 \
@@ -175,60 +175,60 @@ static int foreseenTemporary(char* pattern, int flags) {
         return __atomic_load_n(&next, __ATOMIC_RELAXED) arguments;              \
     }
 
-/** Nothing is forced to the disk: no test looks at it after a loss of power, and each would wait for it. */
-#define STAND_FOR_SYNC(name)                                              \
+/** Defines a function that does nothing instead of syncing: no test simulates a power failure, and syncing is slow. */
+#define INTERPOSE_SYNC(name)                                              \
     VISIBLE int name(int file) {                                          \
-        const struct OperationVerdict verdict = verdictOn(operationSync); \
+        const struct OperationFailure failure = failureOf(operationSync); \
         (void)file;                                                       \
-        errno = verdict.error != 0 ? verdict.error : errno;               \
-        return verdict.error != 0 ? -1 : 0;                               \
+        errno = failure.error != 0 ? failure.error : errno;               \
+        return failure.error != 0 ? -1 : 0;                               \
     }
 
 #ifndef LAW_SANITIZE
-STAND_BEFORE_MEMORY(malloc, (size_t size), (size))
-STAND_BEFORE_MEMORY(calloc, (size_t count, size_t size), (count, size))
-STAND_BEFORE_MEMORY(realloc, (void* memory, size_t size), (memory, size))
+INTERPOSE_ALLOCATION(malloc, (size_t size), (size))
+INTERPOSE_ALLOCATION(calloc, (size_t count, size_t size), (count, size))
+INTERPOSE_ALLOCATION(realloc, (void* memory, size_t size), (memory, size))
 #endif
 
 #define BOTH(first, second) first, second
 
-STAND_BEFORE_OPENING(open, (const char* path, int flags, ...), path)
-STAND_BEFORE_OPENING(open64, (const char* path, int flags, ...), path)
-STAND_BEFORE_OPENING(openat, (int directory, const char* path, int flags, ...), BOTH(directory, path))
-STAND_BEFORE_OPENING(openat64, (int directory, const char* path, int flags, ...), BOTH(directory, path))
-STAND_BEFORE_TEMPORARY(mkostemp)
-STAND_BEFORE_TEMPORARY(mkostemp64)
-STAND_BEFORE_STREAM(fopen)
-STAND_BEFORE_STREAM(fopen64)
-STAND_BEFORE(operationOpen, NULL, FILE*, fdopen, (int file, const char* mode), (file, mode))
-STAND_BEFORE(operationOpen, -1, int, socket, (int domain, int type, int protocol), (domain, type, protocol))
-STAND_BEFORE_PATH(operationOpen, -1, int, mkdir, (const char* path, mode_t mode), (path, mode))
+INTERPOSE_OPEN(open, (const char* path, int flags, ...), path)
+INTERPOSE_OPEN(open64, (const char* path, int flags, ...), path)
+INTERPOSE_OPEN(openat, (int directory, const char* path, int flags, ...), BOTH(directory, path))
+INTERPOSE_OPEN(openat64, (int directory, const char* path, int flags, ...), BOTH(directory, path))
+INTERPOSE_TEMPORARY(mkostemp)
+INTERPOSE_TEMPORARY(mkostemp64)
+INTERPOSE_STREAM_OPEN(fopen)
+INTERPOSE_STREAM_OPEN(fopen64)
+INTERPOSE(operationOpen, NULL, FILE*, fdopen, (int file, const char* mode), (file, mode))
+INTERPOSE(operationOpen, -1, int, socket, (int domain, int type, int protocol), (domain, type, protocol))
+INTERPOSE_PATH(operationOpen, -1, int, mkdir, (const char* path, mode_t mode), (path, mode))
 
-STAND_BEFORE_TRANSFER(operationRead, -1, ssize_t, read, (int file, void* data, size_t size), size, (file, data, size))
-STAND_BEFORE_TRANSFER(operationWrite, -1, ssize_t, write, (int file, const void* data, size_t size), size,
-                      (file, data, size))
-STAND_BEFORE_TRANSFER(operationWrite, -1, ssize_t, writev, (int file, const struct iovec* parts, int count), count,
-                      (file, parts, count))
-STAND_BEFORE_TRANSFER(operationWrite, 0, size_t, fwrite, (const void* data, size_t size, size_t count, FILE* file),
-                      count, (data, size, count, file))
-STAND_BEFORE(operationWrite, -1, ssize_t, sendto,
-             (int file, const void* data, size_t size, int flags, __CONST_SOCKADDR_ARG address, socklen_t length),
-             (file, data, size, flags, address, length))
-STAND_BEFORE(operationWrite, EOF, int, fflush, (FILE * file), (file))
-STAND_BEFORE(operationSeek, -1, off_t, lseek, (int file, off_t offset, int whence), (file, offset, whence))
-STAND_BEFORE(operationSeek, -1, off64_t, lseek64, (int file, off64_t offset, int whence), (file, offset, whence))
-STAND_FOR_SYNC(fsync)
-STAND_BEFORE(operationRename, -1, int, rename, (const char* from, const char* to), (from, to))
-STAND_BEFORE(operationRemove, -1, int, unlink, (const char* path), (path))
-STAND_BEFORE(operationRemove, -1, int, remove, (const char* path), (path))
-STAND_BEFORE_CLOSING(close, (int file), (file))
-STAND_BEFORE_CLOSING(fclose, (FILE * file), (file))
-STAND_BEFORE_PATH(operationStatus, -1, int, stat, (const char* path, struct stat* status), (path, status))
-STAND_BEFORE_PATH(operationStatus, -1, int, stat64, (const char* path, struct stat64* status), (path, status))
-STAND_BEFORE(operationStatus, -1, int, fstat, (int file, struct stat* status), (file, status))
-STAND_BEFORE(operationStatus, -1, int, fstat64, (int file, struct stat64* status), (file, status))
-STAND_BEFORE_PATH(operationStatus, -1, int, statvfs, (const char* path, struct statvfs* status), (path, status))
-STAND_BEFORE_PATH(operationStatus, -1, int, access, (const char* path, int mode), (path, mode))
-STAND_BEFORE(operationAttributes, -1, int, fchmod, (int file, mode_t mode), (file, mode))
-STAND_BEFORE(operationAttributes, -1, int, fchown, (int file, uid_t owner, gid_t group), (file, owner, group))
-STAND_BEFORE_PATH(operationResolve, NULL, char*, realpath, (const char* path, char* resolved), (path, resolved))
+INTERPOSE_TRANSFER(operationRead, -1, ssize_t, read, (int file, void* data, size_t size), size, (file, data, size))
+INTERPOSE_TRANSFER(operationWrite, -1, ssize_t, write, (int file, const void* data, size_t size), size,
+                   (file, data, size))
+INTERPOSE_TRANSFER(operationWrite, -1, ssize_t, writev, (int file, const struct iovec* parts, int count), count,
+                   (file, parts, count))
+INTERPOSE_TRANSFER(operationWrite, 0, size_t, fwrite, (const void* data, size_t size, size_t count, FILE* file), count,
+                   (data, size, count, file))
+INTERPOSE(operationWrite, -1, ssize_t, sendto,
+          (int file, const void* data, size_t size, int flags, __CONST_SOCKADDR_ARG address, socklen_t length),
+          (file, data, size, flags, address, length))
+INTERPOSE(operationWrite, EOF, int, fflush, (FILE * file), (file))
+INTERPOSE(operationSeek, -1, off_t, lseek, (int file, off_t offset, int whence), (file, offset, whence))
+INTERPOSE(operationSeek, -1, off64_t, lseek64, (int file, off64_t offset, int whence), (file, offset, whence))
+INTERPOSE_SYNC(fsync)
+INTERPOSE(operationRename, -1, int, rename, (const char* from, const char* to), (from, to))
+INTERPOSE(operationRemove, -1, int, unlink, (const char* path), (path))
+INTERPOSE(operationRemove, -1, int, remove, (const char* path), (path))
+INTERPOSE_CLOSE(close, (int file), (file))
+INTERPOSE_CLOSE(fclose, (FILE * file), (file))
+INTERPOSE_PATH(operationStatus, -1, int, stat, (const char* path, struct stat* status), (path, status))
+INTERPOSE_PATH(operationStatus, -1, int, stat64, (const char* path, struct stat64* status), (path, status))
+INTERPOSE(operationStatus, -1, int, fstat, (int file, struct stat* status), (file, status))
+INTERPOSE(operationStatus, -1, int, fstat64, (int file, struct stat64* status), (file, status))
+INTERPOSE_PATH(operationStatus, -1, int, statvfs, (const char* path, struct statvfs* status), (path, status))
+INTERPOSE_PATH(operationStatus, -1, int, access, (const char* path, int mode), (path, mode))
+INTERPOSE(operationAttributes, -1, int, fchmod, (int file, mode_t mode), (file, mode))
+INTERPOSE(operationAttributes, -1, int, fchown, (int file, uid_t owner, gid_t group), (file, owner, group))
+INTERPOSE_PATH(operationResolve, NULL, char*, realpath, (const char* path, char* resolved), (path, resolved))

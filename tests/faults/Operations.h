@@ -1,18 +1,18 @@
 #pragma once
 
 /*
- * Operations of the system that a small library, linked before all others, stands in front of. It defines them under
- * their own names, so that the calls of the libraries under test come through it, whoever loads them and whenever.
+ * Interposes functions of the C library. The library defines them under their own names and must be linked before all
+ * others, so that the libraries under test call them.
  */
 
 #ifdef __cplusplus
 extern "C" {
 #endif
 
-/** What can fail; several functions of the system are one kind. */
+/** Operations that can fail. A kind comprises several functions. */
 enum OperationKind {
-    operationAllocate,   /**< operator new, which is not of the system: Faults.cpp replaces it */
-    operationTakeMemory, /**< malloc, calloc, realloc, but for operator new; with sanitizers, none is seen */
+    operationAllocate,   /**< operator new, which Faults.cpp replaces */
+    operationTakeMemory, /**< malloc, calloc, realloc, except in operator new; not counted with sanitizers */
     operationOpen,       /**< open, openat, mkostemp, fopen, fdopen, mkdir, socket */
     operationRead,       /**< read */
     operationWrite,      /**< write, writev, fwrite, fflush, sendto */
@@ -20,37 +20,37 @@ enum OperationKind {
     operationSync,       /**< fsync */
     operationRename,     /**< rename */
     operationRemove,     /**< unlink, remove */
-    operationClose,      /**< close, fclose: what is open is closed all the same */
+    operationClose,      /**< close, fclose; close the file even if they fail */
     operationStatus,     /**< stat, fstat, statvfs, access */
     operationAttributes, /**< fchmod, fchown */
     operationResolve,    /**< realpath */
     operationKinds
 };
 
-/** What becomes of an operation. */
-struct OperationVerdict {
-    int error;  /**< it fails with this errno value; 0: it is done */
-    int partly; /**< it is done for half of what it was asked for: read, write, writev, fwrite */
+/** Failure of an operation. */
+struct OperationFailure {
+    int error;  /**< errno value of the failure; 0 for success */
+    int partly; /**< complete only half of the operation: read, write, writev, fwrite */
 };
 
-/** Judges every operation, on the thread that is about to do it. */
-typedef struct OperationVerdict (*OperationJudge)(enum OperationKind kind);
+/** Called before every operation, on its thread. Returns how the operation fails. */
+typedef struct OperationFailure (*OperationHook)(enum OperationKind kind);
 
-/** From now on; null, as at the start: every operation is done. */
-__attribute__((visibility("default"))) void setOperationJudge(OperationJudge judge);
+/** Sets the hook. Null, the initial value, lets every operation succeed. */
+__attribute__((visibility("default"))) void setOperationHook(OperationHook hook);
 
-/** Is told, on the thread that is about to make it, of each file that is made unless it is there. */
-typedef void (*CreationWitness)(const char* path);
+/** Called before a file is created, on the creating thread. */
+typedef void (*CreationObserver)(const char* path);
 
 /**
- * From now on; null, as at the start: nobody is told. As long as there is one, the first name that a temporary file is
- * tried to be given can be foreseen, so that the witness may be there first.
+ * Sets the observer; null, the initial value, for none. While an observer is set, the first name of a temporary file is
+ * predictable, so that the observer can create the file first.
  */
-__attribute__((visibility("default"))) void setCreationWitness(CreationWitness witness);
+__attribute__((visibility("default"))) void setCreationObserver(CreationObserver observer);
 
 /**
- * Whatever path begins with this is not there, from now on: no test may look at the machine's own files.
- * @param beginning stays the caller's, and has to stay as it is
+ * Makes all paths with this prefix nonexistent, so that tests cannot access files of the host.
+ * @param beginning borrowed; must stay unchanged
  */
 __attribute__((visibility("default"))) void setAbsentDirectory(const char* beginning);
 

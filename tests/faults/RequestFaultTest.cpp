@@ -1,9 +1,9 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "Course.h"
+#include "ExpectedOutcome.h"
 
-// Each operation of the system and each allocation of each request fails in turn, alone and with all after it.
+// Each system call and each allocation of each request fails, alone and with all later ones.
 
 namespace faults {
 namespace {
@@ -13,87 +13,86 @@ using testing::ElementsAre;
 using testing::StartsWith;
 
 /**
- * What a failure may leave that is neither as it was nor as it should be, with the reason (docs/data-files.md). Nothing
- * else is let pass.
+ * Known deviations from "changed completely or not at all" (docs/data-files.md). Any other deviation fails the test.
  */
-enum class Exception {
+enum class Deviation {
     none,
-    modificationHalfWay,  ///< the provider sets the properties one after the other, and takes none back
-    assetNotRead,         ///< the provider goes on where reading asset.dat failed, and writes all of its keys
+    partialModification,  ///< the provider sets properties one by one and does not roll back
+    assetNotRead,         ///< the provider continues after a failure to read asset.dat and writes all keys
 };
 
-Exception exceptionFor(const Request& request, const Fault& fault) {
+Deviation deviationFor(const Request& request, const Fault& fault) {
     if (request.instance.properties.empty()) {
-        return Exception::none;
+        return Deviation::none;
     }
     if (request.changes == std::string(assetFile)) {
-        return hindersReading(fault) ? Exception::assetNotRead : Exception::none;
+        return preventsReading(fault) ? Deviation::assetNotRead : Deviation::none;
     }
-    return isOnFiles(fault.kind) ? Exception::none : Exception::modificationHalfWay;
+    return isOnFiles(fault.kind) ? Deviation::none : Deviation::partialModification;
 }
 
 class RequestFaultTest : public testing::TestWithParam<Request> {
 protected:
-    RequestFaultTest() : course(undisturbed(scene, request())) {}
+    RequestFaultTest() : expected(runWithoutFaults(environment, request())) {}
 
     static const Request& request() { return GetParam(); }
     static bool changes() { return request().changes != nullptr; }
-    const std::string& file() const { return course.file; }
+    const std::string& file() const { return expected.file; }
 
     void failOne(const Fault& fault) {
-        scene.restart();
-        const Done done = scene.ask(request(), &fault);
-        EXPECT_FALSE(done.outcome.threw) << "an exception left the provider";
-        EXPECT_EQ(done.outcome.rc, course.done.outcome.rc);
-        EXPECT_FALSE(done.outcome.hasMessage);
-        EXPECT_EQ(done.leftOpen, 0);
-        expectPartOfAnswer(course, done.outcome, !isOnFiles(fault.kind));
-        const FileContents files = scene.files();
+        environment.restart();
+        const Response response = environment.ask(request(), &fault);
+        EXPECT_FALSE(response.outcome.threw) << "an exception left the provider";
+        EXPECT_EQ(response.outcome.rc, expected.response.outcome.rc);
+        EXPECT_FALSE(response.outcome.hasMessage);
+        EXPECT_EQ(response.leakedDescriptors, 0);
+        expectPartOfAnswer(expected, response.outcome, !isOnFiles(fault.kind));
+        const FileContents files = environment.files();
         EXPECT_THAT(namesOf(files), ElementsAre(leaseFile, warrantyFile, assetFile)) << "a temporary file stays";
-        for (const auto& [name, content] : scene.filesAtFirst()) {
+        for (const auto& [name, content] : environment.filesAtFirst()) {
             if (!changes() || name != file()) {
                 EXPECT_EQ(files.at(name), content);
             }
         }
-        expectNoMoreThanTheException(exceptionFor(request(), fault), fault, files.at(file()));
+        expectOnlyKnownDeviation(deviationFor(request(), fault), fault, files.at(file()));
         if (changes()) {
             expectRepairable(files.at(file()), fault);
         }
     }
 
-    Scene scene;
-    const Course course;
+    TestEnvironment environment;
+    const ExpectedOutcome expected;
 
 private:
-    void expectNoMoreThanTheException(Exception exception, const Fault& fault, const std::string& content) {
-        if (exception == Exception::assetNotRead) {
-            expectAssetFile(course, fault, content);
+    void expectOnlyKnownDeviation(Deviation deviation, const Fault& fault, const std::string& content) {
+        if (deviation == Deviation::assetNotRead) {
+            expectAssetFile(expected, fault, content);
             return;
         }
         if (file() == assetFile) {
-            EXPECT_THAT(content, AnyOf(course.fileBefore, course.fileAfter));
+            EXPECT_THAT(content, AnyOf(expected.fileBefore, expected.fileAfter));
         }
-        const Lines now = scene.instancesOf(classOf(file()));
-        if (exception == Exception::modificationHalfWay) {
-            expectSetInOrder(course, request(), now);
+        const Lines now = environment.instancesOf(classOf(file()));
+        if (deviation == Deviation::partialModification) {
+            expectSetInOrder(expected, request(), now);
         } else {
-            EXPECT_THAT(now, AnyOf(course.before, course.after));
+            EXPECT_THAT(now, AnyOf(expected.before, expected.after));
         }
     }
 
-    /** The next change stores everything. */
+    /** Expects that the next change stores everything. */
     void expectRepairable(const std::string& content, const Fault& fault) {
-        EXPECT_EQ(scene.ask(repairOf(file())).outcome.rc, CMPI_RC_OK);
-        const Lines kept = scene.instancesOf(classOf(file()));
-        const std::string whole = scene.files().at(file());
-        scene.unload();
-        EXPECT_EQ(scene.instancesOf(classOf(file())), kept);
+        EXPECT_EQ(environment.ask(repairOf(file())).outcome.rc, CMPI_RC_OK);
+        const Lines kept = environment.instancesOf(classOf(file()));
+        const std::string whole = environment.files().at(file());
+        environment.unload();
+        EXPECT_EQ(environment.instancesOf(classOf(file())), kept);
         if (file() == assetFile) {
             EXPECT_NE(whole.find("USER.Location=repaired\n"), std::string::npos);
         } else if (fault.kind == operationWrite) {
             EXPECT_THAT(whole, StartsWith(content)) << "the beginning of what is in memory";
         } else {
-            EXPECT_THAT(content, AnyOf(course.fileBefore, whole)) << "as before or as in memory";
+            EXPECT_THAT(content, AnyOf(expected.fileBefore, whole)) << "as before or as in memory";
         }
     }
 
@@ -106,12 +105,12 @@ private:
     }
 };
 
-TEST_P(RequestFaultTest, IsServedWithoutMemoryAndLeavesWhatItHadSetByThen) {
-    eachFault(course.done.counts, memoryFailures(), [&](const Fault& fault) { failOne(fault); });
+TEST_P(RequestFaultTest, IsServedAndKeepsTheValuesSetSoFarIfAllocationsFail) {
+    eachFault(expected.response.counts, memoryFailures(), [&](const Fault& fault) { failOne(fault); });
 }
 
-TEST_P(RequestFaultTest, IsServedWithoutFilesAndLeavesAllAsItWasOrAsItShouldBeUnlessItCouldNotReadAssetData) {
-    eachFault(course.done.counts, fileFailures(), [&](const Fault& fault) { failOne(fault); });
+TEST_P(RequestFaultTest, IsServedAndChangesAllOrNothingIfFileOperationsFail) {
+    eachFault(expected.response.counts, fileFailures(), [&](const Fault& fault) { failOne(fault); });
 }
 
 INSTANTIATE_TEST_SUITE_P(Requests, RequestFaultTest, testing::ValuesIn(allRequests()),

@@ -1,7 +1,7 @@
 #include <ostream>
 #include <stdexcept>
 
-#include "Scene.h"
+#include "TestEnvironment.h"
 #include "support/Values.h"
 
 namespace faults {
@@ -226,7 +226,7 @@ const Request& requestNamed(const std::string& name) {
 
 namespace {
 
-/** A change of one value for each file. @param number of the record's term; that with which it is made is 1 */
+/** Returns a change of one value per file. @param number value of the record's term; a new record has 1 */
 std::map<std::string, Request> smallChanges(unsigned int number) {
     return {
         {leaseFile, changing("repair", leaseFile, identified("VELKO_Lease", "lease number 1"),
@@ -244,7 +244,7 @@ const Request& repairOf(const std::string& dataFile) {
     return repairs.at(dataFile);
 }
 
-const Request& detourOf(const std::string& dataFile) {
+const Request& otherChangeOf(const std::string& dataFile) {
     static const std::map<std::string, Request> detours = smallChanges(3);
     return detours.at(dataFile);
 }

@@ -6,9 +6,9 @@
 #include <set>
 
 #include "Killing.h"
-#include "Scene.h"
+#include "TestEnvironment.h"
 
-// What a failure in the middle of a rewrite leaves of a file of records. docs/data-files.md gives these figures.
+// State of a record file after a fault during a rewrite. docs/data-files.md documents these figures.
 
 namespace faults {
 namespace {
@@ -21,17 +21,17 @@ protected:
     RewriteFaultTest() { restart(); }
 
     void restart() {
-        FileContents files = scene.filesAtFirst();
+        FileContents files = environment.filesAtFirst();
         files[leaseFile] = leaseRecords(leases);
-        scene.restart(files);
+        environment.restart(files);
     }
 
-    /** A rewrite with a fault in it; gives what is left of the file. */
+    /** Rewrites the file with a fault and returns its content. */
     std::string rewriteWith(const Fault& fault) {
         restart();
-        const Done done = scene.ask(requestNamed("ModifyLease"), &fault);
-        EXPECT_EQ(done.outcome.rc, CMPI_RC_OK);
-        return scene.files().at(leaseFile);
+        const Response response = environment.ask(requestNamed("ModifyLease"), &fault);
+        EXPECT_EQ(response.outcome.rc, CMPI_RC_OK);
+        return environment.files().at(leaseFile);
     }
 
     static Fault writeFailing(int number, bool lasting, int error = ENOSPC) {
@@ -40,13 +40,13 @@ protected:
 
     std::string wholeFile() {
         restart();
-        scene.ask(requestNamed("ModifyLease"));
-        return scene.files().at(leaseFile);
+        environment.ask(requestNamed("ModifyLease"));
+        return environment.files().at(leaseFile);
     }
 
     int allocationsOfRewrite() {
         restart();
-        return scene.ask(requestNamed("ModifyLease")).counts.at(operationAllocate);
+        return environment.ask(requestNamed("ModifyLease")).counts.at(operationAllocate);
     }
 
     static std::string firstLines(const std::string& text, int count) {
@@ -57,10 +57,10 @@ protected:
         return text.substr(0, end);
     }
 
-    /** Each lease's lines, as clients see them. */
+    /** Returns the properties of each lease. */
     std::vector<Lines> leasesListed() {
         std::vector<Lines> listed;
-        for (const std::string& line : scene.instancesOf("VELKO_Lease")) {
+        for (const std::string& line : environment.instancesOf("VELKO_Lease")) {
             if (line.rfind("InstanceID=", 0) == 0) {
                 listed.emplace_back();
             }
@@ -69,17 +69,17 @@ protected:
         return listed;
     }
 
-    Scene scene;
+    TestEnvironment environment;
 };
 
-TEST_F(RewriteFaultTest, ADiskThatIsFullFromALineOnKeepsTheLinesBeforeIt) {
+TEST_F(RewriteFaultTest, AFullDiskKeepsTheLinesWrittenBefore) {
     const std::string whole = wholeFile();
     for (int number = 1; number <= writesOfRewrite; ++number) {
         ASSERT_EQ(rewriteWith(writeFailing(number, true)), firstLines(whole, number - 1));
     }
 }
 
-TEST_F(RewriteFaultTest, ALineThatFailsOnceIsTheLast) {
+TEST_F(RewriteFaultTest, AFailedLineIsTheLast) {
     const std::string whole = wholeFile();
     for (int number = 1; number <= writesOfRewrite; ++number) {
         ASSERT_EQ(rewriteWith(writeFailing(number, false)), firstLines(whole, number))
@@ -87,7 +87,7 @@ TEST_F(RewriteFaultTest, ALineThatFailsOnceIsTheLast) {
     }
 }
 
-TEST_F(RewriteFaultTest, WhatIsWrittenInPartsOrInterruptedIsWrittenToItsEnd) {
+TEST_F(RewriteFaultTest, PartialAndInterruptedWritesAreCompleted) {
     const std::string whole = wholeFile();
     for (const int number : {1, 2, writesOfRewrite / 2, writesOfRewrite}) {
         EXPECT_EQ(rewriteWith(writeFailing(number, false, EINTR)), whole);
@@ -95,9 +95,8 @@ TEST_F(RewriteFaultTest, WhatIsWrittenInPartsOrInterruptedIsWrittenToItsEnd) {
     }
 }
 
-/** The modification ends where the memory is refused, and what it has set by then is kept: in the order of the lines.
- */
-TEST_F(RewriteFaultTest, MemoryThatIsRefusedOnceKeepsTheFileOrWritesAllOfItWithTheValuesSetByThen) {
+/** The modification ends at the failed allocation and keeps the properties set so far, in file order. */
+TEST_F(RewriteFaultTest, OneFailedAllocationKeepsTheFileOrWritesItWithTheValuesSetSoFar) {
     const std::string before = leaseRecords(leases);
     const std::string whole = wholeFile();
     const int allocations = allocationsOfRewrite();
@@ -115,36 +114,36 @@ TEST_F(RewriteFaultTest, MemoryThatIsRefusedOnceKeepsTheFileOrWritesAllOfItWithT
     EXPECT_GT(seen.size(), 2U) << "half-way modifications";
 }
 
-TEST_F(RewriteFaultTest, MemoryThatIsRefusedFromThenOnKeepsTheFile) {
+TEST_F(RewriteFaultTest, LastingAllocationFailuresKeepTheFile) {
     const int allocations = allocationsOfRewrite();
     for (int number = 1; number <= allocations; ++number) {
         ASSERT_EQ(rewriteWith({operationAllocate, number, true}), leaseRecords(leases)) << number;
     }
 }
 
-TEST_F(RewriteFaultTest, AnOpeningThatFailsKeepsTheFile) {
+TEST_F(RewriteFaultTest, AFailedOpenKeepsTheFile) {
     for (const int error : {EMFILE, EACCES}) {
         EXPECT_EQ(rewriteWith({operationOpen, 1, false, error}), leaseRecords(leases));
     }
 }
 
-TEST_F(RewriteFaultTest, AClosingThatFailsHasWrittenTheFileWhole) {
+TEST_F(RewriteFaultTest, AFailedCloseWritesTheCompleteFile) {
     const std::string whole = wholeFile();
     for (const bool lasting : {false, true}) {
         EXPECT_EQ(rewriteWith({operationClose, 1, lasting, EIO}), whole);
     }
 }
 
-TEST_F(RewriteFaultTest, AfterARestartTheRecordsBeforeTheGapAreThereAndCopiesStandForTheRest) {
+TEST_F(RewriteFaultTest, ARestartLoadsCompleteRecordsAndCopiesInPlaceOfTheRest) {
     wholeFile();
     const std::vector<Lines> before = leasesListed();
     EXPECT_EQ(rewriteWith(writeFailing(1, true)), "");
-    scene.unload();
+    environment.unload();
     EXPECT_EQ(leasesListed().size(), 0U) << "an empty file is no lease";
     for (int number = 2; number <= writesOfRewrite; ++number) {
         SCOPED_TRACE(number);
         rewriteWith(writeFailing(number, true));
-        scene.unload();
+        environment.unload();
         const std::vector<Lines> listed = leasesListed();
         const auto intact = static_cast<std::size_t>((number - 2) / linesOfLease);
         ASSERT_EQ(listed.size(), before.size());
@@ -159,36 +158,36 @@ TEST_F(RewriteFaultTest, TheNextChangeInTheSameProcessWritesEverything) {
     const std::string whole = wholeFile();
     for (const int number : {1, 2, 60, writesOfRewrite}) {
         rewriteWith(writeFailing(number, true));
-        scene.ask(repairOf(leaseFile));
-        EXPECT_EQ(scene.files().at(leaseFile), whole);
+        environment.ask(repairOf(leaseFile));
+        EXPECT_EQ(environment.files().at(leaseFile), whole);
     }
 }
 
-TEST_F(RewriteFaultTest, AFileWhoseCountIsPutRightLosesNoneOfItsWholeRecords) {
+TEST_F(RewriteFaultTest, CorrectingTheCountKeepsAllCompleteRecords) {
     const int intact = 4;
     const std::string rest = rewriteWith(writeFailing(2 + intact * linesOfLease + 5, true));
-    scene.unload();
-    FileContents files = scene.files();
+    environment.unload();
+    FileContents files = environment.files();
     files[leaseFile] = std::to_string(intact) + rest.substr(rest.find('\n'));
-    scene.restart(files);
+    environment.restart(files);
     EXPECT_EQ(leasesListed().size(), static_cast<std::size_t>(intact));
-    scene.ask(repairOf(leaseFile));
-    EXPECT_EQ(scene.files().at(leaseFile),
+    environment.ask(repairOf(leaseFile));
+    EXPECT_EQ(environment.files().at(leaseFile),
               std::to_string(intact) + firstLines(rest, 1 + intact * linesOfLease).substr(2));
 }
 
 /** A rewrite of either class. */
 class OperationsOfRewriteTest : public testing::TestWithParam<const char*> {};
 
-TEST_P(OperationsOfRewriteTest, AreAnOpeningAWriteForEachLineAndAClosing) {
-    Scene scene;
+TEST_P(OperationsOfRewriteTest, AreOneOpenOneWritePerLineAndOneClose) {
+    TestEnvironment environment;
     const Request& request = requestNamed(GetParam());
-    FileContents files = scene.filesAtFirst();
+    FileContents files = environment.filesAtFirst();
     files[leaseFile] = leaseRecords(leases);
     files[warrantyFile] = warrantyRecords(leases);
-    scene.restart(files);
-    const Counts counts = scene.ask(request).counts;
-    const std::string content = scene.files().at(request.changes);
+    environment.restart(files);
+    const Counts counts = environment.ask(request).counts;
+    const std::string content = environment.files().at(request.changes);
     const int lines = static_cast<int>(std::count(content.begin(), content.end(), '\n'));
     EXPECT_EQ(lines, 1 + leases * (request.changes == std::string(leaseFile) ? linesOfLease : linesOfWarranty));
     EXPECT_EQ(onFiles(counts), (Counts{{operationOpen, 1}, {operationWrite, lines}, {operationClose, 1}}));

@@ -5,9 +5,9 @@
 #include <filesystem>
 #include <tuple>
 
-#include "Course.h"
+#include "ExpectedOutcome.h"
 
-// The data directory goes while a request works, and comes back later.
+// The data directory is removed during a request and restored later.
 
 namespace faults {
 namespace {
@@ -17,42 +17,42 @@ using testing::AnyOf;
 using testing::IsEmpty;
 using testing::Not;
 
-class VanishingTest : public testing::TestWithParam<std::tuple<Scene::Library, Request>> {
+class VanishingTest : public testing::TestWithParam<std::tuple<TestEnvironment::Library, Request>> {
 protected:
-    VanishingTest() : scene(std::get<0>(GetParam())), course(undisturbed(scene, request())) {}
+    VanishingTest() : environment(std::get<0>(GetParam())), expected(runWithoutFaults(environment, request())) {}
 
     static const Request& request() { return std::get<1>(GetParam()); }
-    static bool hasGate() { return std::get<0>(GetParam()) == Scene::Library::gate; }
-    const std::string& file() const { return course.file; }
-    fs::path data() const { return scene.dataDirectory(); }
-    fs::path away() const { return scene.directory() / "away"; }
+    static bool hasGate() { return std::get<0>(GetParam()) == TestEnvironment::Library::gate; }
+    const std::string& file() const { return expected.file; }
+    fs::path data() const { return environment.dataDirectory(); }
+    fs::path away() const { return environment.directory() / "away"; }
 
     static Lines sorted(Lines lines) {
         std::sort(lines.begin(), lines.end());
         return lines;
     }
-    Lines now() { return sorted(scene.instancesOf(classOf(file()))); }
+    Lines now() { return sorted(environment.instancesOf(classOf(file()))); }
 
-    /** The answer to the request in whose middle, or right before which, the directory goes. */
+    /** Removes the directory during or, if moment is null, before the request. Returns the outcome. */
     testsupport::Outcome askWhileVanishing(const Fault* moment) {
-        scene.restart();
-        scene.library();
+        environment.restart();
+        environment.library();
         const auto vanish = [this] { fs::rename(data(), away()); };
         if (moment == nullptr) {
             vanish();
         }
         const Fault vanishing = moment == nullptr ? Fault{} : Fault{moment->kind, moment->number, false, 0, vanish};
-        const Done done = scene.ask(request(), moment == nullptr ? nullptr : &vanishing);
-        EXPECT_FALSE(done.outcome.threw);
-        EXPECT_EQ(done.leftOpen, 0);
-        return done.outcome;
+        const Response response = environment.ask(request(), moment == nullptr ? nullptr : &vanishing);
+        EXPECT_FALSE(response.outcome.threw);
+        EXPECT_EQ(response.leakedDescriptors, 0);
+        return response.outcome;
     }
 
     void vanishAt(const Fault* moment) {
         const testsupport::Outcome outcome = askWhileVanishing(moment);
-        const bool isAnswered = outcome.rc == course.done.outcome.rc;
+        const bool isAnswered = outcome.rc == expected.response.outcome.rc;
         if (isAnswered) {
-            expectPartOfAnswer(course, outcome);
+            expectPartOfAnswer(expected, outcome);
         } else {
             EXPECT_TRUE(hasGate()) << "the provider's answer is the same";
             EXPECT_EQ(outcome.rc, CMPI_RC_ERR_FAILED);
@@ -61,52 +61,53 @@ protected:
         if (file() != assetFile) {
             expectInMemory(isAnswered);
         }
-        expectServedWhileItIsGone();
+        expectServedWithoutDirectory();
         fs::rename(away(), data());
         if (file() == assetFile) {
-            EXPECT_THAT(scene.files().at(assetFile), AnyOf(course.fileBefore, course.fileAfter));
+            EXPECT_THAT(environment.files().at(assetFile), AnyOf(expected.fileBefore, expected.fileAfter));
         }
         expectNextChangeStoresEverything();
     }
 
     void expectInMemory(bool isAnswered) {
         if (hasGate()) {
-            EXPECT_EQ(now(), sorted(isAnswered ? course.after : course.before));
+            EXPECT_EQ(now(), sorted(isAnswered ? expected.after : expected.before));
         } else {
-            EXPECT_THAT(scene.instancesOf(classOf(file())), AnyOf(course.before, course.after));
+            EXPECT_THAT(environment.instancesOf(classOf(file())), AnyOf(expected.before, expected.after));
         }
     }
 
-    void expectServedWhileItIsGone() {
-        const Done done = scene.ask(detourOf(file()));
-        EXPECT_EQ(done.outcome.rc, hasGate() ? CMPI_RC_ERR_FAILED : CMPI_RC_OK);
+    void expectServedWithoutDirectory() {
+        const Response response = environment.ask(otherChangeOf(file()));
+        EXPECT_EQ(response.outcome.rc, hasGate() ? CMPI_RC_ERR_FAILED : CMPI_RC_OK);
         EXPECT_FALSE(fs::exists(data())) << "nobody makes it";
     }
 
     void expectNextChangeStoresEverything() {
-        EXPECT_EQ(scene.ask(detourOf(file())).outcome.rc, CMPI_RC_OK);
-        EXPECT_EQ(scene.ask(repairOf(file())).outcome.rc, CMPI_RC_OK);
+        EXPECT_EQ(environment.ask(otherChangeOf(file())).outcome.rc, CMPI_RC_OK);
+        EXPECT_EQ(environment.ask(repairOf(file())).outcome.rc, CMPI_RC_OK);
         const Lines kept = now();
-        scene.unload();
+        environment.unload();
         EXPECT_EQ(now(), kept);
     }
 
-    Scene scene;
-    const Course course;
+    TestEnvironment environment;
+    const ExpectedOutcome expected;
 };
 
-TEST_P(VanishingTest, AnswersAsItShouldAndTheNextChangeStoresEverything) {
+TEST_P(VanishingTest, ReturnsTheExpectedOutcomeAndTheNextChangeStoresEverything) {
     vanishAt(nullptr);
-    eachMoment(course.done.counts, [&](const Fault& moment) { vanishAt(&moment); });
+    eachMoment(expected.response.counts, [&](const Fault& moment) { vanishAt(&moment); });
 }
 
 std::string nameOfTest(const testing::TestParamInfo<VanishingTest::ParamType>& tested) {
-    const bool hasGate = std::get<0>(tested.param) == Scene::Library::gate;
+    const bool hasGate = std::get<0>(tested.param) == TestEnvironment::Library::gate;
     return std::string(std::get<1>(tested.param).name) + (hasGate ? "ThroughTheGate" : "");
 }
 
 INSTANTIATE_TEST_SUITE_P(Requests, VanishingTest,
-                         testing::Combine(testing::Values(Scene::Library::provider, Scene::Library::gate),
+                         testing::Combine(testing::Values(TestEnvironment::Library::provider,
+                                                          TestEnvironment::Library::gate),
                                           testing::ValuesIn(allRequests())),
                          nameOfTest);
 

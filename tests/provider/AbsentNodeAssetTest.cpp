@@ -1,4 +1,4 @@
-// An agent that lacks the computer's node, or the system's: no asset data are read.
+// Agents without a computer node or without a system node: the asset data are not read.
 
 #include "AssetSupport.h"
 
@@ -29,7 +29,7 @@ using testing::ElementsAre;
 
 using AbsentNodeAsset = AssetFile;
 
-TEST_F(AbsentNodeAsset, LeavesTheFileUnread) {
+TEST_F(AbsentNodeAsset, DoesNotReadTheFile) {
     write(path(), "USER.Name=Anna\n");
     const AssetIDDetails element;
     expectNothingStored(element);
@@ -38,12 +38,12 @@ TEST_F(AbsentNodeAsset, LeavesTheFileUnread) {
         ElementsAre(entering("AssetIDDetails", "AssetIDDetails.cpp"), exiting("AssetIDDetails", "AssetIDDetails.cpp")));
 }
 
-TEST_F(AbsentNodeAsset, CreatesTheFileAllTheSame) {
+TEST_F(AbsentNodeAsset, CreatesTheFile) {
     const AssetIDDetails element;
     EXPECT_TRUE(std::filesystem::is_regular_file(path()));
 }
 
-TEST_F(AbsentNodeAsset, StandsOnWhatComputerThereIs) {
+TEST_F(AbsentNodeAsset, StartsAtTheComputerIfThereIsOne) {
     AssetIDDetails element;
     EXPECT_EQ(stands(element), hasComputer);
     std::string text = "before";
@@ -53,7 +53,7 @@ TEST_F(AbsentNodeAsset, StandsOnWhatComputerThereIs) {
     EXPECT_FALSE(stands(element));
 }
 
-TEST_F(AbsentNodeAsset, TakesVendorAndIdentifyingNumberFromWhatSystemThereIs) {
+TEST_F(AbsentNodeAsset, ReturnsVendorAndIdentifyingNumberIfThereIsASystem) {
     const AssetIDDetails element;
     std::string text = "before";
     EXPECT_EQ(element.getVendor(text), !hasComputer);

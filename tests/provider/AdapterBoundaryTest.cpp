@@ -1,5 +1,5 @@
-// What adapters make of a framework that fails, or that writes a value and says that there is none. The program's own
-// operations take the place of the framework's.
+// Adapters over a framework that fails, or that writes a value and returns false. The program replaces operations of
+// the framework.
 
 #include "CMPIAssetIDDetail.h"
 #include "KO/Exceptions.h"
@@ -13,7 +13,7 @@
 
 namespace {
 
-/** What the framework does before it tells the computer's place, and how often it was asked. */
+/** Called before the framework returns the computer's path; counts the calls. */
 struct ComputerDouble {
     std::function<void()> before = [] {};
     int asked = 0;
@@ -34,7 +34,7 @@ std::string KO::Instrumentation::getPathToComputer() {
     return "/system/computer";
 }
 
-/** Writes a value for every property, and says of one alone that the instance has it. */
+/** Writes a value for every property but returns true for one property only. */
 bool KO::ProviderUtilities::getProperty(const CMPIInstance*, const char* name, std::string& value, bool) {
     value = std::string("written for ") + name;
     return name == std::string(onlyProperty);
@@ -51,7 +51,7 @@ using KO::LeaseWarrantyProvider::AssetIDDetails;
 
 class AssetModificationBoundary : public CleanAgent {};
 
-TEST_F(AssetModificationBoundary, TakesNoValueThatTheInstanceIsSaidNotToHave) {
+TEST_F(AssetModificationBoundary, IgnoresValuesOfMissingProperties) {
     write(agentEnvironment::dataDirectory() / "asset.dat",
           "USER.AssetNumber=A-1\nUSER.Name=Ann\nUSER.PurchaseDate=20250101000000.000000+000\nUSER.Location=Hall\n");
     AssetIDDetails details;
@@ -72,7 +72,7 @@ TEST_F(AssetModificationBoundary, TakesNoValueThatTheInstanceIsSaidNotToHave) {
     EXPECT_EQ(pairs, (std::vector<AssetIDDetails::PersonalizedPair>(5)));
 }
 
-/** The two classes whose records clients create. */
+/** Tests both classes whose records clients can create. */
 class CreationBoundary : public RequestTest {
 protected:
     void SetUp() override {
@@ -93,7 +93,7 @@ protected:
     static constexpr const char* classNames[] = {"VELKO_Lease", "VELKO_Warranty"};
 };
 
-TEST_F(CreationBoundary, AsksForTheComputersPlaceOnce) {
+TEST_F(CreationBoundary, RequestsTheComputersPathOnce) {
     for (const char* className : classNames) {
         computer().asked = 0;
         EXPECT_EQ(create(className, {textKey("InstanceID", "A")}), CMPI_RC_OK);
@@ -103,7 +103,7 @@ TEST_F(CreationBoundary, AsksForTheComputersPlaceOnce) {
     EXPECT_EQ(WarrantyBase::cache.table.size(), 1U);
 }
 
-TEST_F(CreationBoundary, AsksForTheComputersPlaceAlsoWithoutAKey) {
+TEST_F(CreationBoundary, RequestsTheComputersPathEvenWithoutAKey) {
     for (const char* className : classNames) {
         computer().asked = 0;
         EXPECT_EQ(create(className, {}), CMPI_RC_OK);
@@ -114,7 +114,7 @@ TEST_F(CreationBoundary, AsksForTheComputersPlaceAlsoWithoutAKey) {
     expectNothingMade();
 }
 
-TEST_F(CreationBoundary, MakesNothingWhenTheComputersPlaceCannotBeTold) {
+TEST_F(CreationBoundary, CreatesNothingIfTheComputersPathIsNotAvailable) {
     computer().before = [] { throw KO::InstrumentationException("no tree"); };
     for (const char* className : classNames) {
         EXPECT_EQ(create(className, {textKey("InstanceID", "A")}), CMPI_RC_OK);

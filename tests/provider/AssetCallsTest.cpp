@@ -1,5 +1,4 @@
-// What the asset element asks of the framework, in which order and under which lock, and what it does
-// when the framework fails.
+// Order and locking of the asset element's calls to the framework, and failures of the framework.
 
 #include "AssetFileDouble.h"
 #include "AssetSupport.h"
@@ -60,7 +59,7 @@ protected:
         CleanAgent::TearDown();
     }
 
-    /** The calls of an operation. */
+    /** Returns the calls of an operation. */
     template <class Operation>
     static Calls callsOf(Operation operation) {
         const std::size_t before = assetFileDouble::calls().size();
@@ -82,7 +81,7 @@ TEST_F(AssetCalls, CreateTheFileAndReadItUnderTheLock) {
     EXPECT_THAT(callsOf([] { EXPECT_TRUE(loaded(AssetIDDetails())); }), ElementsAreArray(expected));
 }
 
-TEST_F(AssetCalls, CreateTheFileUnderTheLockWhenThePathIsAskedFor) {
+TEST_F(AssetCalls, CreateTheFileUnderTheLockInGetFileName) {
     AssetIDDetails element;
     EXPECT_THAT(callsOf([&] { element.getFileName(); }), ElementsAreArray(creation));
 }
@@ -117,7 +116,7 @@ TEST_F(AssetCalls, WriteTheFileUnderTheLock) {
                                        "~PropertyFile"}));
 }
 
-TEST_F(AssetCalls, OfAccessorsTouchNoFile) {
+TEST_F(AssetCalls, OfAccessorsAccessNoFile) {
     AssetIDDetails element;
     EXPECT_TRUE(callsOf([&] {
                     for (const TextGetter& getter : textGetters) {
@@ -129,11 +128,11 @@ TEST_F(AssetCalls, OfAccessorsTouchNoFile) {
                 }).empty());
 }
 
-/** Ways to fail. */
+/** Exceptions of each type. */
 const std::function<void()> failures[] = {[] { throw KO::FrameworkException("no"); },
                                           [] { throw std::runtime_error("no"); }, [] { throw 5; }};
 
-TEST_F(AssetCalls, ThatFailInReadingLeaveNothingStoredAndTheLockFree) {
+TEST_F(AssetCalls, ThatFailToReadLeaveNoValuesAndReleaseTheLock) {
     for (const char* call :
          {"PropertyFile asset.dat", "PropertyFile::open 1", "read text USER.AssetNumber", "read text USER.Phone",
           "read date USER.LastInventoried", "read text USER.ZOPMProfile", "read text USER.PersonalizedLabel1",
@@ -151,14 +150,14 @@ TEST_F(AssetCalls, ThatFailInReadingLeaveNothingStoredAndTheLockFree) {
     }
 }
 
-TEST_F(AssetCalls, AfterAFailedReadAreNotMade) {
+TEST_F(AssetCalls, StopAfterAFailedRead) {
     assetFileDouble::before("read text USER.Phone", failures[0]);
     const Calls calls = callsOf([] { AssetIDDetails(); });
     EXPECT_EQ(Calls(calls.end() - 3, calls.end()),
               (Calls{"read text USER.Phone locked", "unlock locked", "~PropertyFile"}));
 }
 
-/** Lets the lock fail where it is taken for the first time, or for the second, and so on. */
+/** Lets the lock fail when it is acquired for the Nth time. */
 void failLock(int number, const std::function<void()>& failure) {
     assetFileDouble::before(lock, [number, failure, taken = 0]() mutable {
         if (++taken == number) {
@@ -179,7 +178,7 @@ TEST_F(AssetCalls, ThatCannotLockForReadingReadNothing) {
     }
 }
 
-TEST_F(AssetCalls, ThatCannotLockForCreatingTheFileCreateNone) {
+TEST_F(AssetCalls, ThatCannotLockForCreatingTheFileCreateNoFile) {
     for (const auto& failure : failures) {
         assetFileDouble::forget();
         agentEnvironment::forgetLog();
@@ -195,7 +194,7 @@ TEST_F(AssetCalls, ThatCannotLockForCreatingTheFileCreateNone) {
     }
 }
 
-/** Of each time that the lock is given back in an operation: whether this had been told before. */
+/** Returns, for each release of the lock in an operation, whether the failure was already logged. */
 template <class Operation>
 std::vector<bool> toldWhenUnlocked(const char* function, const char* text, Operation operation) {
     std::vector<bool> told;
@@ -210,7 +209,7 @@ std::vector<bool> toldWhenUnlocked(const char* function, const char* text, Opera
     return told;
 }
 
-TEST_F(AssetCalls, ThatFailInReadingAreToldBeforeTheLockIsGivenBack) {
+TEST_F(AssetCalls, ThatFailToReadAreLoggedBeforeTheLockIsReleased) {
     const auto make = [] { AssetIDDetails(); };
     assetFileDouble::before("File::open 3", failures[0]);
     EXPECT_THAT(toldWhenUnlocked("getFileName", creationFailed, make), ElementsAre(true, true));
@@ -220,14 +219,14 @@ TEST_F(AssetCalls, ThatFailInReadingAreToldBeforeTheLockIsGivenBack) {
         << "the lock is first held for the file's creation";
 }
 
-TEST_F(AssetCalls, ThatFailInWritingAreToldAfterTheLockIsGivenBack) {
+TEST_F(AssetCalls, ThatFailToWriteAreLoggedAfterTheLockIsReleased) {
     AssetIDDetails element;
     assetFileDouble::before("PropertyFile::close", failures[0]);
     EXPECT_THAT(toldWhenUnlocked("flushAssetData", writingFailed, [&] { element.flushAssetData(); }),
                 ElementsAre(false));
 }
 
-TEST_F(AssetCalls, ReadLabelAndDataOfAPairBeforeEitherIsTold) {
+TEST_F(AssetCalls, ReadLabelAndDataOfAPairBeforeEitherIsLogged) {
     std::vector<std::size_t> toldBefore;
     for (const char* number : {"1", "2", "3", "4", "5"}) {
         assetFileDouble::before(std::string("read text USER.PersonalizedData") + number, [&] {
@@ -242,7 +241,7 @@ TEST_F(AssetCalls, ReadLabelAndDataOfAPairBeforeEitherIsTold) {
     EXPECT_THAT(toldBefore, ElementsAre(0, 2, 4, 6, 8));
 }
 
-TEST_F(AssetCalls, KeepWhatWasReadBeforeAFailure) {
+TEST_F(AssetCalls, KeepValuesReadBeforeAFailure) {
     assetFileDouble::values() = {{"USER.AssetNumber", "A-1"}, {"USER.Name", "Anna"}, {"USER.Position", "P"}};
     assetFileDouble::before("read text USER.Phone", failures[0]);
     AssetIDDetails element;
@@ -269,7 +268,7 @@ TEST_F(AssetCalls, ThatCannotCreateTheFileStillReadIt) {
     }
 }
 
-TEST_F(AssetCalls, ThatFailInWritingAreOnlyToldAndLeaveTheLockFree) {
+TEST_F(AssetCalls, ThatFailToWriteAreOnlyLoggedAndReleaseTheLock) {
     for (const char* call : {"PropertyFile asset.dat", lock, "PropertyFile::open 3", "write text USER.AssetNumber=",
                              "write text USER.PersonalizedData5=Null", "PropertyFile::close"}) {
         for (const auto& failure : failures) {

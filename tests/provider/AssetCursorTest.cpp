@@ -1,4 +1,4 @@
-// The asset element as a cursor over the computers, and what it says of each.
+// The asset element as a cursor over the computers, and the properties of each.
 
 #include "AssetIDDetails.h"
 #include "Support.h"
@@ -39,7 +39,7 @@ protected:
         element.setFilter(static_cast<AssetIDDetails::FilterType>(type), value);
     }
 
-    /** The product name that the computer of a name has, if any, given into a text. */
+    /** Reads the product name of the computer with that name. */
     static bool productName(const std::string& computer, std::string& text) {
         AssetIDDetails element;
         filter(element, AssetIDDetails::FILTER_NAME, computer);
@@ -48,7 +48,7 @@ protected:
     }
 };
 
-TEST_F(AssetCursor, VisitsEveryComputerWithoutEvaluatingBeforeAFilterIsSet) {
+TEST_F(AssetCursor, VisitsEveryComputerWithoutAFilter) {
     AssetIDDetails element;
     EXPECT_THAT(walked(element), ElementsAre("spaced", "tight", "dashless", "dash first", "dash second", "many dashes",
                                              "empty", "productless", "(none)"));
@@ -56,7 +56,7 @@ TEST_F(AssetCursor, VisitsEveryComputerWithoutEvaluatingBeforeAFilterIsSet) {
     EXPECT_TRUE(element.evaluate());
 }
 
-TEST_F(AssetCursor, StandsOnTheComputerOfTheNameFilterAndOnThoseWhoseNameCannotBeRead) {
+TEST_F(AssetCursor, SelectsComputersByNameAndThoseWithoutAName) {
     AssetIDDetails element;
     filter(element, AssetIDDetails::FILTER_NAME, "tight");
     EXPECT_THAT(walked(element), ElementsAre("tight", "(none)"));
@@ -69,7 +69,7 @@ TEST_F(AssetCursor, StaysAtTheEnd) {
     EXPECT_FALSE(stands(element));
 }
 
-TEST_F(AssetCursor, ComparesTheVendorOfTheSystem) {
+TEST_F(AssetCursor, FiltersByTheVendorOfTheSystem) {
     AssetIDDetails matching;
     filter(matching, AssetIDDetails::FILTER_VENDOR, "Example Maker");
     EXPECT_EQ(walked(matching).size(), 9U);
@@ -80,7 +80,7 @@ TEST_F(AssetCursor, ComparesTheVendorOfTheSystem) {
     }
 }
 
-TEST_F(AssetCursor, ComparesTheVersionOfTheProduct) {
+TEST_F(AssetCursor, FiltersByTheVersionOfTheProduct) {
     AssetIDDetails matching;
     filter(matching, AssetIDDetails::FILTER_VERSION, "4.2.0");
     EXPECT_EQ(walked(matching).size(), 9U);
@@ -89,7 +89,7 @@ TEST_F(AssetCursor, ComparesTheVersionOfTheProduct) {
     EXPECT_FALSE(stands(other));
 }
 
-TEST_F(AssetCursor, ComparesTheIdentifyingNumberForTypeZeroAndForTypesWithoutName) {
+TEST_F(AssetCursor, FiltersByIdentifyingNumberForTypeZeroAndUnnamedTypes) {
     for (const int type : {0, 4, 7, -1}) {
         AssetIDDetails matching;
         filter(matching, type, "/system%20one");
@@ -100,7 +100,7 @@ TEST_F(AssetCursor, ComparesTheIdentifyingNumberForTypeZeroAndForTypesWithoutNam
     }
 }
 
-TEST_F(AssetCursor, WantsEveryFilterToPass) {
+TEST_F(AssetCursor, RequiresEveryFilterToPass) {
     AssetIDDetails element;
     filter(element, AssetIDDetails::FILTER_VENDOR, "Example Maker");
     filter(element, AssetIDDetails::FILTER_NAME, "dashless");
@@ -111,7 +111,7 @@ TEST_F(AssetCursor, WantsEveryFilterToPass) {
     EXPECT_FALSE(element.evaluate());
 }
 
-TEST_F(AssetCursor, FiltersFromWhereItStands) {
+TEST_F(AssetCursor, FiltersFromTheCurrentComputer) {
     AssetIDDetails element;
     ++element;
     ++element;
@@ -119,7 +119,7 @@ TEST_F(AssetCursor, FiltersFromWhereItStands) {
     EXPECT_THAT(walked(element), ElementsAre("(none)"));
 }
 
-TEST_F(AssetCursor, GivesTheComputersNameUnderBothNames) {
+TEST_F(AssetCursor, ReturnsTheComputersNameFromBothGetters) {
     AssetIDDetails element;
     std::string text;
     EXPECT_TRUE(element.getCSName(text));
@@ -136,7 +136,7 @@ TEST_F(AssetCursor, GivesTheComputersNameUnderBothNames) {
     EXPECT_EQ(text, "before");
 }
 
-TEST_F(AssetCursor, GivesWhatBelongsToTheSystemAndTheProductForEveryComputer) {
+TEST_F(AssetCursor, ReturnsTheSameSystemAndProductForEveryComputer) {
     AssetIDDetails element;
     for (; element; ++element) {
         std::string vendor;
@@ -150,7 +150,7 @@ TEST_F(AssetCursor, GivesWhatBelongsToTheSystemAndTheProductForEveryComputer) {
     }
 }
 
-TEST_F(AssetCursor, CutsTheProductNameBeforeTheBlankOfItsFirstDash) {
+TEST_F(AssetCursor, TruncatesTheProductNameOneCharacterBeforeTheFirstDash) {
     const std::pair<const char*, const char*> cut[] = {
         {"spaced", "Model X"}, {"tight", "Mode"}, {"many dashes", "Model X"}, {"dash second", ""}};
     for (const auto& [computer, expected] : cut) {
@@ -160,13 +160,13 @@ TEST_F(AssetCursor, CutsTheProductNameBeforeTheBlankOfItsFirstDash) {
     }
 }
 
-TEST_F(AssetCursor, GivesAProductNameThatBeginsWithADashWhole) {
+TEST_F(AssetCursor, ReturnsAProductNameWithALeadingDashUnchanged) {
     std::string text = "before";
     EXPECT_TRUE(productName("dash first", text));
     EXPECT_EQ(text, "-Tower - Red");
 }
 
-TEST_F(AssetCursor, LeavesTheTextAloneForAProductNameWithoutDashAndSaysTrue) {
+TEST_F(AssetCursor, ReturnsTrueAndNoValueForAProductNameWithoutADash) {
     for (const char* computer : {"dashless", "empty"}) {
         std::string text = "before";
         EXPECT_TRUE(productName(computer, text));
@@ -174,13 +174,13 @@ TEST_F(AssetCursor, LeavesTheTextAloneForAProductNameWithoutDashAndSaysTrue) {
     }
 }
 
-TEST_F(AssetCursor, LeavesTheTextAloneWithoutAProductNameAndSaysFalse) {
+TEST_F(AssetCursor, ReturnsFalseAndNoValueWithoutAProductName) {
     std::string text = "before";
     EXPECT_FALSE(productName("productless", text));
     EXPECT_EQ(text, "before");
 }
 
-/** Seconds since 1970 of a CIM datetime text. */
+/** Converts a CIM datetime string to seconds since 1970. */
 std::time_t secondsOf(const std::string& text) {
     std::tm fields{};
     int micro = 0;
@@ -195,7 +195,7 @@ std::time_t secondsOf(const std::string& text) {
     return timegm(&fields) - (sign == '-' ? -offset : offset) * 60;
 }
 
-/** Another time zone than that of the process, in the form of the variable TZ, while it lives. */
+/** Sets the variable TZ while it exists. */
 class TimeZone {
 public:
     explicit TimeZone(const char* zone) {
@@ -215,7 +215,7 @@ private:
     std::optional<std::string> before;
 };
 
-TEST_F(AssetCursor, TellsThePresentTimeInTheTimeZoneOfTheProcess) {
+TEST_F(AssetCursor, ReturnsTheCurrentTimeInTheTimeZoneOfTheProcess) {
     const AssetIDDetails element;
     for (const auto& [zone, offset] :
          {std::pair("EAST-5:30", "+330"), std::pair("WEST3", "-180"), std::pair("UTC0", "+000")}) {
@@ -230,7 +230,7 @@ TEST_F(AssetCursor, TellsThePresentTimeInTheTimeZoneOfTheProcess) {
     }
 }
 
-TEST_F(AssetCursor, TellsThePresentTime) {
+TEST_F(AssetCursor, ReturnsTheCurrentTime) {
     const AssetIDDetails element;
     const std::time_t before = std::time(nullptr);
     const std::string text = element.getLocalDateTime();

@@ -17,7 +17,7 @@ struct State {
     bool locked = false;
 };
 
-/** Made at its first use: the element's lock is a static object. */
+/** Constructed on first use, since the element's lock is a static object. */
 State& state() {
     static State& theState = *new State;
     return theState;

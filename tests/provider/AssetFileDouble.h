@@ -6,24 +6,24 @@
 #include <vector>
 
 /**
- * Stands in for the framework's locks, files and property files: notes the calls that the asset
- * element makes of them, and whether the lock was held, and fails where it is told to.
+ * Test double of the framework's locks, files and property files. Records the calls of the asset element and whether
+ * the lock was held, and injects failures.
  */
 namespace assetFileDouble {
 
-/** The calls since forget(), each with its arguments; " locked" at the end of one made under the lock. */
+/** Returns the calls since forget(), each with its arguments, and with the suffix " locked" if the lock was held. */
 const std::vector<std::string>& calls();
 
-/** Whether the lock is held now. */
+/** Returns whether the lock is held. */
 bool locked();
 
-/** What is read under each key; a key not there reads as empty. */
+/** Values by key. A key that is not in the map has an empty value. */
 std::map<std::string, std::string>& values();
 
-/** Runs an action before each call that reads so, arguments included. One that throws is the call's failure. */
+/** Runs an action before each call with this string, including its arguments. If the action throws, the call fails. */
 void before(const std::string& call, std::function<void()> action);
 
-/** Drops calls, values and actions. */
+/** Clears calls, values and actions. */
 void forget();
 
 }  // namespace assetFileDouble

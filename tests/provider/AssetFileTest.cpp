@@ -24,7 +24,7 @@ TEST_F(AssetFile, IsCreatedEmptyAndReadAsEmptyValues) {
     EXPECT_EQ(pairsOf(element), Pairs(5, nullPair));
 }
 
-TEST_F(AssetFile, GivesEachValueUnderItsKey) {
+TEST_F(AssetFile, ReturnsTheValueOfEachKey) {
     std::string content;
     for (const TextGetter& getter : textGetters) {
         content += std::string(getter.key) + "=text of " + getter.key + "\n";
@@ -43,12 +43,12 @@ TEST_F(AssetFile, GivesEachValueUnderItsKey) {
     EXPECT_EQ(valueOf(element, dateGetters[3]), "20260101000000.000000+060");
 }
 
-TEST_F(AssetFile, GivesNullForWhatIsMissingOfThePersonalizedPairs) {
+TEST_F(AssetFile, ReturnsNullForMissingPersonalizedValues) {
     write(path(), "USER.PersonalizedLabel3=Cost centre\n");
     EXPECT_EQ(pairsOf(AssetIDDetails()), (Pairs{nullPair, nullPair, {"Cost centre", "Null"}, nullPair, nullPair}));
 }
 
-TEST_F(AssetFile, GivesTheFivePersonalizedPairsInOrder) {
+TEST_F(AssetFile, ReturnsTheFivePersonalizedPairsInOrder) {
     std::string content = "USER.PersonalizedLabel6=six\nUSER.PersonalizedData6=six\n";
     for (const char* number : {"5", "4", "3", "2", "1"}) {
         content += std::string("USER.PersonalizedData") + number + "=d" + number + "\n";
@@ -58,42 +58,42 @@ TEST_F(AssetFile, GivesTheFivePersonalizedPairsInOrder) {
     EXPECT_EQ(pairsOf(AssetIDDetails()), (Pairs{{"l1", "d1"}, {"l2", "d2"}, {"l3", "d3"}, {"l4", "d4"}, {"l5", "d5"}}));
 }
 
-TEST_F(AssetFile, GivesNullForAnEmptyPersonalizedTextThatIsThere) {
+TEST_F(AssetFile, ReturnsNullForEmptyPersonalizedValues) {
     write(path(),
           "USER.PersonalizedLabel1=\nUSER.PersonalizedData1=data\nUSER.PersonalizedLabel2=label\n"
           "USER.PersonalizedData2=\n");
     EXPECT_EQ(pairsOf(AssetIDDetails()), (Pairs{{"Null", "data"}, {"label", "Null"}, nullPair, nullPair, nullPair}));
 }
 
-TEST_F(AssetFile, GivesNoDateForATextThatIsNone) {
+TEST_F(AssetFile, ReturnsAnUnsetDateForAnInvalidDate) {
     write(path(), "USER.PurchaseDate=yesterday\nUSER.AssetNumber=A-1\n");
     const AssetIDDetails element;
     EXPECT_EQ(valueOf(element, dateGetters[1]), noDate);
     EXPECT_EQ(valueOf(element, textGetters[0]), "A-1");
 }
 
-TEST_F(AssetFile, IsLeftAsItIsByReading) {
+TEST_F(AssetFile, IsUnchangedByReading) {
     const std::string content = "# by hand\nUSER.Name = Anna \nOTHER=1\nnot a property\n";
     write(path(), content);
     EXPECT_EQ(valueOf(AssetIDDetails(), textGetters[2]), "Anna");
     EXPECT_EQ(file(), content);
 }
 
-TEST_F(AssetFile, HasItsPathInTheDataDirectory) {
+TEST_F(AssetFile, IsInTheDataDirectory) {
     AssetIDDetails element;
     std::filesystem::remove(path());
     EXPECT_EQ(std::filesystem::path(element.getFileName()), path());
     EXPECT_TRUE(std::filesystem::exists(path())) << "asking for the path creates the file";
 }
 
-TEST_F(AssetFile, KeepsItsContentWhenItsPathIsAskedFor) {
+TEST_F(AssetFile, IsUnchangedByGetFileName) {
     AssetIDDetails element;
     write(path(), "USER.Name=Anna\n");
     element.getFileName();
     EXPECT_EQ(file(), "USER.Name=Anna\n");
 }
 
-/** What the log says of a file that cannot be opened. */
+/** Expects the log records of a file that cannot be opened. */
 void expectFailureTold() {
     const auto creation = recordsOf("AssetIDDetails.cpp", "getFileName");
     ASSERT_EQ(creation.size(), 3U);
@@ -108,21 +108,21 @@ void expectFailureTold() {
     EXPECT_EQ(failure->level, 4000);
 }
 
-TEST_F(AssetFile, ThatCannotBeOpenedLeavesNothingStoredAndThrowsNothing) {
+TEST_F(AssetFile, ProvidesNoValuesAndThrowsNothingIfItCannotBeOpened) {
     blockWithDirectory(path());
     const AssetIDDetails element;
     expectNothingStored(element);
     expectFailureTold();
 }
 
-TEST_F(AssetFile, WithoutADataDirectoryLeavesNothingStored) {
+TEST_F(AssetFile, ProvidesNoValuesWithoutADataDirectory) {
     std::filesystem::remove_all(agentEnvironment::dataDirectory());
     const AssetIDDetails element;
     expectNothingStored(element);
     expectFailureTold();
 }
 
-TEST_F(AssetFile, ThatCannotBeOpenedStillLeavesTheCursor) {
+TEST_F(AssetFile, DoesNotAffectTheCursorIfItCannotBeOpened) {
     blockWithDirectory(path());
     AssetIDDetails element;
     std::string text;
@@ -142,20 +142,20 @@ TEST_F(AssetFile, IsReadAgainByTheNextElement) {
     EXPECT_EQ(valueOf(AssetIDDetails(), textGetters[2]), "Anna");
 }
 
-TEST_F(AssetFile, IsReadOnceForAnElement) {
+TEST_F(AssetFile, IsReadOncePerElement) {
     write(path(), "USER.Name=Anna\n");
     const AssetIDDetails element;
     write(path(), "USER.Name=Berta\n");
     EXPECT_EQ(valueOf(element, textGetters[2]), "Anna");
 }
 
-/** That the lock is free again: whoever wants it need not wait. */
+/** Expects that the lock is not held. */
 void expectUnlocked() {
     EXPECT_NO_THROW(KO::_fileMutex.lock(0));
     KO::_fileMutex.unlock();
 }
 
-TEST_F(AssetFile, IsUnlockedAgainWhateverHappens) {
+TEST_F(AssetFile, IsAlwaysUnlocked) {
     AssetIDDetails element;
     expectUnlocked();
     element.flushAssetData();

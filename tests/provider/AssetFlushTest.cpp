@@ -1,4 +1,4 @@
-// Changing the asset data and writing them back.
+// Changing and writing the asset data.
 
 #include "AssetSupport.h"
 
@@ -30,7 +30,7 @@ const TextSetter dateSetters[] = {
     {"setZOPMUpdateTime", &AssetIDDetails::setZOPMUpdateTime, 2},
 };
 
-/** The eleven fixed entries, of which one may have a value. */
+/** Returns the eleven fixed entries, with a value for one of them. */
 std::string fixedEntries(const std::string& key = {}, const std::string& value = {}) {
     std::string content;
     for (const char* each :
@@ -58,7 +58,7 @@ TEST_F(AssetFlush, WritesTheFixedKeysAndThenThePairsInOrder) {
     EXPECT_EQ(file(), fixedEntries() + pairEntries(Pairs(5, {"Null", "Null"})));
 }
 
-TEST_F(AssetFlush, WritesEachChangedTextUnderItsKey) {
+TEST_F(AssetFlush, WritesEachChangedStringWithItsKey) {
     for (const TextSetter& setter : textSetters) {
         SCOPED_TRACE(setter.name);
         std::filesystem::remove(path());
@@ -74,7 +74,7 @@ TEST_F(AssetFlush, WritesEachChangedTextUnderItsKey) {
     }
 }
 
-TEST_F(AssetFlush, WritesEachChangedDateUnderItsKey) {
+TEST_F(AssetFlush, WritesEachChangedDateWithItsKey) {
     for (const TextSetter& setter : dateSetters) {
         SCOPED_TRACE(setter.name);
         std::filesystem::remove(path());
@@ -89,7 +89,7 @@ TEST_F(AssetFlush, WritesEachChangedDateUnderItsKey) {
     }
 }
 
-TEST_F(AssetFlush, TakesWhatIsNoDateAsNone) {
+TEST_F(AssetFlush, WritesAnInvalidDateAsUnset) {
     AssetIDDetails element;
     for (const char* text : {"", "yesterday", noDate, "20241399000000.000000+000"}) {
         element.setLastInventoried(someDate);
@@ -98,7 +98,7 @@ TEST_F(AssetFlush, TakesWhatIsNoDateAsNone) {
     }
 }
 
-TEST_F(AssetFlush, GivesTheProfileAndItsTimeUnderBothNames) {
+TEST_F(AssetFlush, ReturnsTheProfileAndItsTimeFromBothGetters) {
     AssetIDDetails element;
     element.setZOPMProfile("profile");
     element.setZOPMUpdateTime(someDate);
@@ -109,7 +109,7 @@ TEST_F(AssetFlush, GivesTheProfileAndItsTimeUnderBothNames) {
     EXPECT_EQ(text, someDate);
 }
 
-TEST_F(AssetFlush, WritesTheAssetTagBackAsItWasRead) {
+TEST_F(AssetFlush, KeepsTheAssetTag) {
     write(path(), "USER.AssetIdTag=TAG-1\n");
     AssetIDDetails element;
     element.setAssetNumber("A-1");
@@ -119,7 +119,7 @@ TEST_F(AssetFlush, WritesTheAssetTagBackAsItWasRead) {
     EXPECT_EQ(valueOf(reread, textGetters[0]), "A-1");
 }
 
-TEST_F(AssetFlush, KeepsKeysThatItDoesNotKnow) {
+TEST_F(AssetFlush, KeepsUnknownKeys) {
     write(path(), "# by hand\nOTHER.Key=kept\nUSER.Name=Anna\nUSER.PersonalizedLabel6=six\n");
     AssetIDDetails element;
     element.setOwnerName("Berta");
@@ -130,7 +130,7 @@ TEST_F(AssetFlush, KeepsKeysThatItDoesNotKnow) {
               "# by hand\nOTHER.Key=kept\nUSER.Name=Berta\nUSER.PersonalizedLabel6=six\n");
 }
 
-TEST_F(AssetFlush, WritesTheWholeSnapshotOverLaterChangesOfTheFile) {
+TEST_F(AssetFlush, OverwritesLaterChangesOfTheFileWithTheSnapshot) {
     write(path(), "USER.Name=Anna\nUSER.Phone=1\n");
     AssetIDDetails element;
     write(path(), "USER.Name=Berta\nUSER.Phone=2\n");
@@ -141,7 +141,7 @@ TEST_F(AssetFlush, WritesTheWholeSnapshotOverLaterChangesOfTheFile) {
     EXPECT_EQ(valueOf(reread, textGetters[3]), "3");
 }
 
-TEST_F(AssetFlush, WritesAsManyPairsAsThereAreAndLeavesTheOthers) {
+TEST_F(AssetFlush, WritesExistingPairsAndKeepsTheOthers) {
     const Pairs before = {{"l1", "d1"}, {"l2", "d2"}, {"l3", "d3"}, {"l4", "d4"}, {"l5", "d5"}};
     write(path(), fixedEntries() + pairEntries(before));
     AssetIDDetails element;
@@ -167,7 +167,7 @@ TEST_F(AssetFlush, WritesNoPairsWhenThereAreNone) {
     EXPECT_EQ(file(), fixedEntries());
 }
 
-TEST_F(AssetFlush, KeepsAnyTextExactly) {
+TEST_F(AssetFlush, KeepsAnyStringExactly) {
     for (const std::string& text : {std::string("Anna = Berta"), std::string("  blanks  "), std::string("two\nlines\r"),
                                     std::string("M\xC3\xBCller \\n # \\"), std::string(5000, 'x')}) {
         AssetIDDetails element;
@@ -180,7 +180,7 @@ TEST_F(AssetFlush, KeepsAnyTextExactly) {
     }
 }
 
-TEST_F(AssetFlush, IsNotDoneByTheElementsEnd) {
+TEST_F(AssetFlush, IsNotCalledByTheDestructor) {
     {
         AssetIDDetails element;
         element.setOwnerName("Anna");
@@ -188,7 +188,7 @@ TEST_F(AssetFlush, IsNotDoneByTheElementsEnd) {
     EXPECT_EQ(file(), "");
 }
 
-TEST_F(AssetFlush, CreatesTheFileWhenItHasGone) {
+TEST_F(AssetFlush, CreatesAMissingFile) {
     AssetIDDetails element;
     std::filesystem::remove(path());
     element.setPersonalizedData({});
@@ -196,7 +196,7 @@ TEST_F(AssetFlush, CreatesTheFileWhenItHasGone) {
     EXPECT_EQ(file(), fixedEntries());
 }
 
-TEST_F(AssetFlush, ThatFailsIsOnlyTold) {
+TEST_F(AssetFlush, OnlyLogsFailures) {
     AssetIDDetails element;
     blockWithDirectory(path());
     agentEnvironment::forgetLog();
@@ -212,7 +212,7 @@ TEST_F(AssetFlush, ThatFailsIsOnlyTold) {
     EXPECT_EQ(valueOf(element, textGetters[2]), "Anna") << "the snapshot is kept";
 }
 
-TEST_F(AssetFlush, AfterAFailedReadWritesEmptyValues) {
+TEST_F(AssetFlush, WritesEmptyValuesAfterAFailedRead) {
     blockWithDirectory(path());
     AssetIDDetails element;
     std::filesystem::remove(path());

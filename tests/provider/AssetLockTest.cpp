@@ -10,7 +10,7 @@ namespace {
 
 using namespace providerTest;
 
-/** Waits until a function of the asset element has told of its entry. */
+/** Waits until a function of the asset element has logged its entry. */
 void awaitEntry(const std::string& function) {
     while (textsOf("AssetIDDetails.cpp", function).empty()) {
         std::this_thread::yield();
@@ -19,7 +19,7 @@ void awaitEntry(const std::string& function) {
 
 using AssetLock = AssetFile;
 
-TEST_F(AssetLock, KeepsAnotherThreadFromCreatingTheFile) {
+TEST_F(AssetLock, PreventsConcurrentCreationOfTheFile) {
     KO::_fileMutex.lock(withoutLimit);
     std::atomic<bool> made{false};
     std::thread other([&] {
@@ -35,7 +35,7 @@ TEST_F(AssetLock, KeepsAnotherThreadFromCreatingTheFile) {
     EXPECT_TRUE(std::filesystem::exists(path()));
 }
 
-TEST_F(AssetLock, KeepsAnotherThreadFromWritingTheFile) {
+TEST_F(AssetLock, PreventsConcurrentWritingOfTheFile) {
     AssetIDDetails element;
     element.setOwnerName("Anna");
     agentEnvironment::forgetLog();

@@ -1,6 +1,6 @@
 #include "support/AgentEnvironment.h"
 
-/** Computers with every form of a product name. */
+/** Computers with every form of product name. */
 const char* const agentNodes = R"(
 [[instrumentation.node]]
 type = 1

@@ -7,7 +7,7 @@
 #include <utility>
 #include <vector>
 
-/** What the tests of the asset element share. */
+/** Helpers for the tests of the asset element. */
 namespace providerTest {
 
 using KO::LeaseWarrantyProvider::AssetIDDetails;
@@ -23,7 +23,7 @@ struct TextGetter {
     const char* key;
 };
 
-/** Stored texts; then stored dates. */
+/** Stored strings, then stored dates. */
 inline const std::vector<TextGetter> textGetters = {
     {"getAssetNumber", &AssetIDDetails::getAssetNumber, "USER.AssetNumber"},
     {"getAssetIdTag", &AssetIDDetails::getAssetIdTag, "USER.AssetIdTag"},
@@ -42,7 +42,7 @@ inline const std::vector<TextGetter> dateGetters = {
     {"getDeploymentUpdateTime", &AssetIDDetails::getDeploymentUpdateTime, "USER.ZOPMUpdateTime"},
 };
 
-/** What a getter gives; "(none)" when it answers that there is nothing. */
+/** Returns the value of a getter, or "(none)" if the getter returns false. */
 inline std::string valueOf(const AssetIDDetails& element, const TextGetter& getter) {
     std::string value = "(untouched)";
     if ((element.*getter.get)(value)) {
@@ -58,7 +58,7 @@ inline Pairs pairsOf(const AssetIDDetails& element) {
     return pairs;
 }
 
-/** That no stored value is given and no output touched. */
+/** Expects that no getter of a stored value returns true or changes its argument. */
 inline void expectNothingStored(const AssetIDDetails& element) {
     for (const auto& getters : {textGetters, dateGetters}) {
         for (const TextGetter& getter : getters) {

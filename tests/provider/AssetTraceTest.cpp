@@ -1,4 +1,4 @@
-// What the asset element tells of its work.
+// Log records of the asset element.
 
 #include "AssetSupport.h"
 
@@ -13,7 +13,7 @@ constexpr const char* source = "AssetIDDetails.cpp";
 
 using AssetTrace = AssetFile;
 
-TEST_F(AssetTrace, TellsOfTheFileItFinds) {
+TEST_F(AssetTrace, LogsTheFilePath) {
     const AssetIDDetails element;
     EXPECT_THAT(textsOf(source, "getFileName"),
                 ElementsAre(entering("getFileName", source),
@@ -21,7 +21,7 @@ TEST_F(AssetTrace, TellsOfTheFileItFinds) {
                             exiting("getFileName", source)));
 }
 
-TEST_F(AssetTrace, TellsWhatItReads) {
+TEST_F(AssetTrace, LogsTheValuesThatItReads) {
     write(path(),
           "USER.AssetNumber=A-1\nUSER.AssetIdTag=TAG\nUSER.Name=Anna\nUSER.Phone=1\nUSER.Position=P\n"
           "USER.Department=D\nUSER.Location=L\nUSER.ZOPMProfile=Z\nUSER.PersonalizedLabel2=two\n");
@@ -47,7 +47,7 @@ TEST_F(AssetTrace, TellsWhatItReads) {
     EXPECT_EQ(texts("log"), texts("trace"));
 }
 
-TEST_F(AssetTrace, AsksForTheFileBeforeItTellsOfItsMaking) {
+TEST_F(AssetTrace, CreatesTheFileBeforeItLogsItsConstruction) {
     const AssetIDDetails element;
     const auto lines = texts();
     ASSERT_GT(lines.size(), 4U);
@@ -56,7 +56,7 @@ TEST_F(AssetTrace, AsksForTheFileBeforeItTellsOfItsMaking) {
     EXPECT_EQ(lines[3], entering("AssetIDDetails", source));
 }
 
-TEST_F(AssetTrace, TellsOfAFilterAtErrorLevel) {
+TEST_F(AssetTrace, LogsFiltersAtErrorLevel) {
     AssetIDDetails element;
     agentEnvironment::forgetLog();
     element.setFilter(AssetIDDetails::FILTER_NAME, "tight");
@@ -71,7 +71,7 @@ TEST_F(AssetTrace, TellsOfAFilterAtErrorLevel) {
     }
 }
 
-TEST_F(AssetTrace, TellsEntryAndExitOfItsOperations) {
+TEST_F(AssetTrace, LogsEntryAndExitOfItsOperations) {
     AssetIDDetails element;
     agentEnvironment::forgetLog();
     EXPECT_TRUE(stands(element));

@@ -1,4 +1,4 @@
-// The adapter of the computer end: the instances of another provider, handed out as they are.
+// The adapter of the computer end, which returns the instances of another provider unchanged.
 
 #include "CMPIComputerSystem.h"
 #include "KO/Exceptions.h"
@@ -17,7 +17,7 @@ using testing::ElementsAre;
 
 using KO::LeaseWarrantyProvider::CMPILAWComputerSystem;
 
-/** An object manager that knows some computer systems, and answers nothing else. */
+/** An object manager that serves only computer systems. */
 class Manager {
 public:
     explicit Manager(std::size_t computers) : computerCount(computers) {
@@ -38,13 +38,13 @@ public:
     CMPIInstance* instance(std::size_t index) { return &instances.at(index); }
     CMPIObjectPath* path(std::size_t index) { return &paths.at(index); }
 
-    /** Sets the type and the state of one of the enumeration's elements. */
+    /** Sets the type and the state of an element of the enumeration. */
     void give(std::size_t index, CMPIType type, CMPIValueState state) {
         types.at(index) = type;
         states.at(index) = state;
     }
 
-    /** Answers of the enumeration and of all instances from now on. */
+    /** Status codes of the enumeration and of all instances from now on. */
     CMPIrc nextStatus = CMPI_RC_OK;
     CMPIrc pathStatus = CMPI_RC_OK;
 
@@ -87,7 +87,7 @@ private:
         return data;
     }
 
-    /** Gives the path whatever the status is. */
+    /** Returns the path regardless of the status. */
     static CMPIObjectPath* getObjectPath(const CMPIInstance* instance, CMPIStatus* rc) {
         auto* path = static_cast<CMPIObjectPath*>(instance->hdl);
         *rc = {of(path).pathStatus, nullptr};
@@ -124,7 +124,7 @@ protected:
 
 constexpr const char* noComputer = "Could not obtain an instance of Computer System";
 
-TEST_F(ComputerSystemAdapter, StandsOnNoneBeforeItsPathIsSet) {
+TEST_F(ComputerSystemAdapter, HasNoInstanceBeforeItsPathIsSet) {
     Manager manager(2);
     CMPILAWComputerSystem adapter(manager.broker(), manager.context(), "root/cimv2");
     expectNone(adapter);
@@ -133,7 +133,7 @@ TEST_F(ComputerSystemAdapter, StandsOnNoneBeforeItsPathIsSet) {
     EXPECT_EQ(manager.enumerations, 0);
 }
 
-TEST_F(ComputerSystemAdapter, HandsOutTheInstancesThatTheObjectManagerGave) {
+TEST_F(ComputerSystemAdapter, ReturnsTheInstancesOfTheObjectManager) {
     Manager manager(3);
     CMPILAWComputerSystem adapter(manager.broker(), manager.context(), "root/cimv2");
     adapter.setObjectPath(manager.classPath());
@@ -147,7 +147,7 @@ TEST_F(ComputerSystemAdapter, HandsOutTheInstancesThatTheObjectManagerGave) {
     }
 }
 
-TEST_F(ComputerSystemAdapter, StandsOnNoneBehindTheLast) {
+TEST_F(ComputerSystemAdapter, HasNoInstanceAfterTheLast) {
     Manager manager(1);
     CMPILAWComputerSystem adapter(manager.broker(), manager.context(), "root/cimv2");
     adapter.setObjectPath(manager.classPath());
@@ -158,7 +158,7 @@ TEST_F(ComputerSystemAdapter, StandsOnNoneBehindTheLast) {
     }
 }
 
-TEST_F(ComputerSystemAdapter, LeavesTheLastOutOfALoopThatAsksItWhetherToGoOn) {
+TEST_F(ComputerSystemAdapter, OmitsTheLastInALoopOverItsCondition) {
     Manager manager(3);
     CMPILAWComputerSystem adapter(manager.broker(), manager.context(), "root/cimv2");
     adapter.setObjectPath(manager.classPath());
@@ -169,7 +169,7 @@ TEST_F(ComputerSystemAdapter, LeavesTheLastOutOfALoopThatAsksItWhetherToGoOn) {
     EXPECT_THAT(visited, ElementsAre(manager.instance(0), manager.instance(1)));
 }
 
-TEST_F(ComputerSystemAdapter, AsksForTheClassOfThePathWithAllProperties) {
+TEST_F(ComputerSystemAdapter, EnumeratesTheClassOfThePathWithAllProperties) {
     Manager manager(1);
     CMPILAWComputerSystem adapter(manager.broker(), manager.context(), "root/elsewhere");
     adapter.setObjectPath(manager.classPath());
@@ -179,7 +179,7 @@ TEST_F(ComputerSystemAdapter, AsksForTheClassOfThePathWithAllProperties) {
     EXPECT_FALSE(manager.listGiven);
 }
 
-TEST_F(ComputerSystemAdapter, AsksNobodyAboutANullPath) {
+TEST_F(ComputerSystemAdapter, DoesNotCallTheBrokerForANullPath) {
     Manager manager(1);
     CMPILAWComputerSystem adapter(manager.broker(), manager.context(), "root/cimv2");
     EXPECT_EQ(refusal(adapter, nullptr), noComputer);
@@ -187,14 +187,14 @@ TEST_F(ComputerSystemAdapter, AsksNobodyAboutANullPath) {
     expectNone(adapter);
 }
 
-TEST_F(ComputerSystemAdapter, CannotBePositionedWithoutAComputer) {
+TEST_F(ComputerSystemAdapter, ThrowsWithoutAComputer) {
     Manager manager(0);
     CMPILAWComputerSystem adapter(manager.broker(), manager.context(), "root/cimv2");
     EXPECT_EQ(refusal(adapter, manager.classPath()), noComputer);
     expectNone(adapter);
 }
 
-TEST_F(ComputerSystemAdapter, KeepsTheEnumerationWhoseFirstInstanceCannotBeHad) {
+TEST_F(ComputerSystemAdapter, KeepsTheEnumerationIfTheFirstInstanceCannotBeRead) {
     Manager manager(2);
     manager.nextStatus = CMPI_RC_ERR_FAILED;
     CMPILAWComputerSystem adapter(manager.broker(), manager.context(), "root/cimv2");
@@ -203,7 +203,7 @@ TEST_F(ComputerSystemAdapter, KeepsTheEnumerationWhoseFirstInstanceCannotBeHad) 
     EXPECT_TRUE(stands(adapter)) << "a further one waits";
 }
 
-TEST_F(ComputerSystemAdapter, StandsOnNoneWhereTheNextCannotBeHad) {
+TEST_F(ComputerSystemAdapter, HasNoInstanceIfTheNextCannotBeRead) {
     Manager manager(3);
     CMPILAWComputerSystem adapter(manager.broker(), manager.context(), "root/cimv2");
     adapter.setObjectPath(manager.classPath());
@@ -216,7 +216,7 @@ TEST_F(ComputerSystemAdapter, StandsOnNoneWhereTheNextCannotBeHad) {
     EXPECT_EQ(adapter.getCMPIInstance(nullptr), manager.instance(1));
 }
 
-TEST_F(ComputerSystemAdapter, HasNoPathWhereTheInstanceDoesNotTellIt) {
+TEST_F(ComputerSystemAdapter, HasNoPathIfTheInstanceReturnsNone) {
     Manager manager(1);
     CMPILAWComputerSystem adapter(manager.broker(), manager.context(), "root/cimv2");
     adapter.setObjectPath(manager.classPath());
@@ -235,7 +235,7 @@ TEST_F(ComputerSystemAdapter, HasNoInstanceIfTheElementIsOfAnotherType) {
     EXPECT_EQ(adapter.getObjectPath(), nullptr);
 }
 
-TEST_F(ComputerSystemAdapter, TakesInstancesFromTheEnumerationWhateverTheirState) {
+TEST_F(ComputerSystemAdapter, IgnoresTheStateOfElements) {
     Manager manager(3);
     manager.give(0, CMPI_instance, CMPI_nullValue);
     manager.give(1, CMPI_instance, CMPI_notFound);

@@ -1,6 +1,6 @@
-// What the elements over record stores tell of their work.
+// Log records of the elements over record stores.
 
-#include "ElementSides.h"
+#include "ElementKinds.h"
 
 #include <gmock/gmock.h>
 
@@ -9,13 +9,15 @@ namespace {
 using namespace providerTest;
 using testing::ElementsAre;
 
-template <class Side>
-class ElementTrace : public RecordStore<typename Side::Store> {
+template <class Kind>
+class ElementTrace : public RecordStore<typename Kind::Store> {
 protected:
-    static std::string source() { return Side::sourceFile; }
-    static std::string named(const std::string& before) { return before + Side::Store::name; }
+    static std::string source() { return Kind::sourceFile; }
+    static std::string named(const std::string& before) { return before + Kind::Store::name; }
 
-    /** What a function tells during an operation, and that all of it is of the unit's logger at flow level. */
+    /**
+     * Returns the messages that a function logs during an operation. Expects the source file's logger and flow level.
+     */
     template <class Operation>
     static std::vector<std::string> told(const std::string& function, Operation operation) {
         agentEnvironment::forgetLog();
@@ -32,36 +34,36 @@ protected:
     }
 };
 
-TYPED_TEST_SUITE(ElementTrace, ElementSides, SideNames);
+TYPED_TEST_SUITE(ElementTrace, ElementKinds, KindNames);
 
-TYPED_TEST(ElementTrace, TellsOfItsMakingAndEnd) {
+TYPED_TEST(ElementTrace, LogsConstructionAndDestruction) {
     EXPECT_EQ(this->told(this->named(""), [] { typename TypeParam::Element element; }),
               this->entryAndExit(this->named("")));
     EXPECT_EQ(this->told(this->named("~"), [] { typename TypeParam::Element element; }),
               this->entryAndExit(this->named("~")));
 }
 
-TYPED_TEST(ElementTrace, NamesTheOperators) {
+TYPED_TEST(ElementTrace, LogsTheNamesOfOperators) {
     this->fill({"A"});
     typename TypeParam::Element element;
     EXPECT_EQ(this->told("operator bool", [&] { EXPECT_TRUE(stands(element)); }), this->entryAndExit("operator bool"));
     EXPECT_EQ(this->told("operator++", [&] { ++element; }), this->entryAndExit("operator++"));
 }
 
-TYPED_TEST(ElementTrace, TellsTypeAndReferenceOfAFilter) {
+TYPED_TEST(ElementTrace, LogsTypeAndValueOfAFilter) {
     this->fill({"A", "B"});
     typename TypeParam::Element element;
     EXPECT_EQ(this->told("setFilter", [&] { element.setFilter(TypeParam::Element::InstanceIDFilter, "B 1"); }),
               this->entryAndExit("setFilter", " filterType=0 reference=B 1"));
 }
 
-TYPED_TEST(ElementTrace, TellsEachEvaluation) {
+TYPED_TEST(ElementTrace, LogsEachEvaluation) {
     this->fill({"A", "B"});
     typename TypeParam::Element element;
     EXPECT_EQ(this->told("evaluate", [&] { element.setFilter(TypeParam::Element::InstanceIDFilter, "B"); }).size(), 4U);
 }
 
-TYPED_TEST(ElementTrace, NamesCreationRemovalAndGetters) {
+TYPED_TEST(ElementTrace, LogsTheNamesOfCreationRemovalAndGetters) {
     typename TypeParam::Element element;
     EXPECT_EQ(this->told(this->named("create"), [&] { TypeParam::create(element, "A"); }),
               this->entryAndExit(this->named("create"), " instanceId=A"));
@@ -77,7 +79,7 @@ TYPED_TEST(ElementTrace, NamesCreationRemovalAndGetters) {
               this->entryAndExit("getDescription"));
 }
 
-TYPED_TEST(ElementTrace, TellsARemovalWithoutFilterAtErrorLevelAndNoExit) {
+TYPED_TEST(ElementTrace, LogsARemovalWithoutAFilterAtErrorLevelAndNoExit) {
     this->fill({"A"});
     typename TypeParam::Element element;
     agentEnvironment::forgetLog();
@@ -90,7 +92,7 @@ TYPED_TEST(ElementTrace, TellsARemovalWithoutFilterAtErrorLevelAndNoExit) {
     EXPECT_EQ(records[1].level, 3000);
 }
 
-TYPED_TEST(ElementTrace, TellsNoExitOfAGetterThatFails) {
+TYPED_TEST(ElementTrace, LogsNoExitOfAFailedGetter) {
     typename TypeParam::Element element;
     std::string text;
     EXPECT_THAT(
@@ -98,10 +100,10 @@ TYPED_TEST(ElementTrace, TellsNoExitOfAGetterThatFails) {
         ElementsAre(entering("getInstanceID", this->source())));
 }
 
-using LeaseTrace = ElementTrace<LeaseElementSide>;
-using WarrantyTrace = ElementTrace<WarrantyElementSide>;
+using LeaseTrace = ElementTrace<LeaseElementKind>;
+using WarrantyTrace = ElementTrace<WarrantyElementKind>;
 
-TEST_F(LeaseTrace, NamesTheAccessorsOfProperties) {
+TEST_F(LeaseTrace, LogsTheNamesOfPropertyAccessors) {
     fill({"A"});
     KO::LeaseWarrantyProvider::Lease lease;
     std::string text;
@@ -115,7 +117,7 @@ TEST_F(LeaseTrace, NamesTheAccessorsOfProperties) {
               entryAndExit("getBargainRenewalOption"));
 }
 
-TEST_F(WarrantyTrace, NamesTheAccessorsOfProperties) {
+TEST_F(WarrantyTrace, LogsTheNamesOfPropertyAccessors) {
     fill({"A"});
     KO::LeaseWarrantyProvider::Warranty warranty;
     std::string text;

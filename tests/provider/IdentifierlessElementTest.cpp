@@ -1,12 +1,12 @@
-// An element over a store whose records give no identifier.
+// An element over a store whose records have no identifier.
 
-#include "ElementSides.h"
+#include "ElementKinds.h"
 #include "RecordElementImpl.h"
 
-// Not in an unnamed namespace: the instantiations below make all their operations, used or not.
+// Not in an unnamed namespace, since the explicit instantiations below define unused operations too.
 namespace providerTest {
 
-/** A store of one record that answers for no property that it has it. */
+/** A store with one record that has no properties. */
 class IdentifierlessBase {
 public:
     enum class Property { InstanceID };
@@ -18,7 +18,7 @@ public:
     bool getProperty(Property, std::string&) const { return false; }
 };
 
-/** The words of an element, over that store. */
+/** The names of an element over that store. */
 template <class Element>
 struct Identifierless {
     using Base = IdentifierlessBase;
@@ -54,13 +54,13 @@ struct IdentifierlessWarranty {
     static constexpr const char* refusal = "Could not find Instance ID property on Warranty.";
 };
 
-template <class Side>
+template <class Kind>
 class IdentifierlessElement : public CleanAgent {};
 
-using IdentifierlessSides = testing::Types<IdentifierlessLease, IdentifierlessWarranty>;
-TYPED_TEST_SUITE(IdentifierlessElement, IdentifierlessSides, SideNames);
+using IdentifierlessKinds = testing::Types<IdentifierlessLease, IdentifierlessWarranty>;
+TYPED_TEST_SUITE(IdentifierlessElement, IdentifierlessKinds, KindNames);
 
-TYPED_TEST(IdentifierlessElement, CannotBeComparedWithAnIdentifier) {
+TYPED_TEST(IdentifierlessElement, ThrowsWhenComparedWithAnIdentifier) {
     typename TypeParam::Element element;
     agentEnvironment::forgetLog();
     EXPECT_EQ(thrown<InstrumentationException>([&] { element.setFilter(TypeParam::Element::InstanceIDFilter, "any"); }),

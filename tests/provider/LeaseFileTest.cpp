@@ -1,6 +1,6 @@
-// What only the lease file has: four flags, and its thirteen lines in their order.
+// Properties of the lease file only: four flags and the order of the thirteen lines.
 
-#include "Sides.h"
+#include "RecordKinds.h"
 
 #include <iterator>
 
@@ -8,14 +8,14 @@ namespace {
 
 using namespace providerTest;
 
-using LeaseFile = RecordStore<LeaseSide>;
+using LeaseFile = RecordStore<LeaseKind>;
 
-/** The flags in file order, and the line of the first. */
+/** The flags in file order, and the line of the first one. */
 constexpr bool LeaseUnit::*flags[] = {&LeaseUnit::EarlyTerminationOption, &LeaseUnit::FixedPricePurchaseOption,
                                       &LeaseUnit::RenewalOption, &LeaseUnit::BargainRenewalOption};
 constexpr std::size_t lineOfFirstFlag = 4;
 
-TEST_F(LeaseFile, StartsARecordWithFlagsClearedNumbersZeroAndTextsEmpty) {
+TEST_F(LeaseFile, InitializesNewRecordsWithFalseZeroAndEmptyStrings) {
     const LeaseUnit expected = [] {
         LeaseUnit unit;
         unit.inUse = true;
@@ -27,14 +27,14 @@ TEST_F(LeaseFile, StartsARecordWithFlagsClearedNumbersZeroAndTextsEmpty) {
         return unit;
     }();
     const LeaseUnit defaults;
-    EXPECT_EQ(LeaseSide::members(defaults), LeaseSide::members(expected));
+    EXPECT_EQ(LeaseKind::members(defaults), LeaseKind::members(expected));
     LeaseUnit named("lease 1");
     EXPECT_EQ(named.InstanceID, "lease 1");
     named.InstanceID = "";
-    EXPECT_EQ(LeaseSide::members(named), LeaseSide::members(expected));
+    EXPECT_EQ(LeaseKind::members(named), LeaseKind::members(expected));
 }
 
-TEST_F(LeaseFile, HoldsThirteenLinesInFileOrder) {
+TEST_F(LeaseFile, ContainsThirteenLinesPerRecordInFileOrder) {
     LeaseUnit unit("lease 1");
     unit.Lessor = "ACME Leasing Co";
     unit.BaseTermCommencementDate = "20240101000000.000000+060";
@@ -60,21 +60,21 @@ TEST_F(LeaseFile, HoldsThirteenLinesInFileOrder) {
               "82\n"
               "73\n"
               "5\n");
-    EXPECT_EQ(LeaseSide::members(reread(unit)), LeaseSide::members(unit));
+    EXPECT_EQ(LeaseKind::members(reread(unit)), LeaseKind::members(unit));
 }
 
-TEST_F(LeaseFile, HoldsEachFlagAsOneOrZero) {
+TEST_F(LeaseFile, StoresFlagsAsOneOrZero) {
     for (std::size_t flag = 0; flag < std::size(flags); ++flag) {
         LeaseUnit unit("A");
         unit.*flags[flag] = true;
-        std::vector<std::string> expected = linesOf(std::string("A\n") + LeaseSide::defaultRecord);
+        std::vector<std::string> expected = linesOf(std::string("A\n") + LeaseKind::defaultRecord);
         expected[lineOfFirstFlag + flag] = "1";
         EXPECT_EQ(linesOf(written(unit)), expected);
         EXPECT_TRUE(reread(unit).*flags[flag]);
     }
 }
 
-/** Two records, of which the first has something else in one line. */
+/** Returns a file of two records and replaces one line of the first. */
 std::string damaged(std::size_t line, const std::string& text) {
     std::vector<std::string> lines = {
         "A", "Ay", "20240101000000.000000+000", "1", "1", "1", "1", "1", "11", "12", "13", "14", "2"};
@@ -86,7 +86,7 @@ std::string damaged(std::size_t line, const std::string& text) {
     return content + "B\nBee\n20250101000000.000000+000\n3\n0\n0\n0\n0\n21\n22\n23\n24\n4\n";
 }
 
-/** That of a damaged record the term and this many flags were read, and nothing behind them; nor the second record. */
+/** Expects that reading stopped in the first record after the term and this number of flags. */
 void expectStopped(const LeaseCache& cache, unsigned int leaseTerm, std::size_t flagsRead) {
     ASSERT_EQ(cache.recordCountLease, 2U);
     ASSERT_EQ(cache.table.size(), 2U);
@@ -98,11 +98,11 @@ void expectStopped(const LeaseCache& cache, unsigned int leaseTerm, std::size_t 
         expected.*flags[flag] = true;
     }
     for (const LeaseUnit& unit : cache.table) {
-        EXPECT_EQ(LeaseSide::members(unit), LeaseSide::members(expected));
+        EXPECT_EQ(LeaseKind::members(unit), LeaseKind::members(expected));
     }
 }
 
-TEST_F(LeaseFile, StopsReadingAtAWordInAFlagLine) {
+TEST_F(LeaseFile, StopsReadingAtANonNumericFlag) {
     for (std::size_t flag = 0; flag < std::size(flags); ++flag) {
         for (const char* text : {"true", "x", "2", "-1", "*"}) {
             SCOPED_TRACE(text);
@@ -111,7 +111,7 @@ TEST_F(LeaseFile, StopsReadingAtAWordInAFlagLine) {
     }
 }
 
-TEST_F(LeaseFile, TakesAFlagWithASignOrLeadingZeros) {
+TEST_F(LeaseFile, AcceptsFlagsWithASignOrLeadingZeros) {
     for (std::size_t flag = 0; flag < std::size(flags); ++flag) {
         for (const auto& [text, value] : {std::pair("+1", true), std::pair("01", true), std::pair("+0", false),
                                           std::pair("00", false), std::pair("-0", false)}) {
@@ -123,22 +123,22 @@ TEST_F(LeaseFile, TakesAFlagWithASignOrLeadingZeros) {
     }
 }
 
-TEST_F(LeaseFile, StopsReadingAtWhatIsNoUnsignedNumber) {
+TEST_F(LeaseFile, StopsReadingAtAnInvalidNumber) {
     for (const char* text : {"x", "-5", "-0", "+", "+-5", "++5", "+x", "+4294967296", "4294967296", ".5", "*"}) {
         SCOPED_TRACE(text);
         expectStopped(*load(damaged(3, text)), 0, 0);
     }
 }
 
-TEST_F(LeaseFile, ReadsTheDigitsAtTheHeadOfANumberLineAndShiftsByTheRest) {
+TEST_F(LeaseFile, ReadsLeadingDigitsOfANumberAndTheRestAsTheNextField) {
     const auto cache = load(damaged(3, "12x"));
     EXPECT_EQ(cache->table[0].LeaseTerm, 12U);
     EXPECT_FALSE(cache->table[0].EarlyTerminationOption);
 }
 
-TEST_F(LeaseFile, KeepsTheValuesOfTheRecordBeforeWhereReadingStopped) {
+TEST_F(LeaseFile, RepeatsValuesOfThePrecedingRecordAfterReadingStops) {
     std::string content = damaged(12, "2");
-    content.replace(content.find("\n23\n"), 4, "\n");  // one line less: the last number finds the file's end
+    content.replace(content.find("\n23\n"), 4, "\n");  // one line less, so the last number is missing
     const auto cache = load(content);
     const LeaseUnit& second = cache->table.at(1);
     EXPECT_EQ(second.InstanceID, "B");
@@ -147,7 +147,7 @@ TEST_F(LeaseFile, KeepsTheValuesOfTheRecordBeforeWhereReadingStopped) {
     EXPECT_EQ(second.NetMonthlyLeaseRateFactor, 2U);
 }
 
-TEST_F(LeaseFile, IsReadAndWrittenByteForByte) {
+TEST_F(LeaseFile, KeepsItsBytesWhenReadAndWritten) {
     const std::string content = contentOf(std::filesystem::path(PROVIDER_TEST_DATA) / "Lease.dat");
     ASSERT_FALSE(content.empty());
     const auto cache = load(content);

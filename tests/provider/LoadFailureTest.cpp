@@ -1,8 +1,7 @@
-// A load that the framework fails. The program's own PlatformUtilities::getKelsaDataDir takes the place of the
-// framework's.
+// Failures of the framework while loading. The program replaces PlatformUtilities::getKelsaDataDir.
 
 #include "KO/PlatformUtilities.h"
-#include "Sides.h"
+#include "RecordKinds.h"
 
 #include <gmock/gmock.h>
 
@@ -10,7 +9,7 @@
 
 namespace {
 
-/** What the framework throws in place of naming the data directory; null for nothing. */
+/** Throws instead of returning the data directory; null for none. */
 void (*insteadOfNaming)() = nullptr;
 
 }  // namespace
@@ -28,22 +27,22 @@ namespace {
 using namespace providerTest;
 using testing::ElementsAre;
 
-template <class Side>
-class LoadFailure : public RecordStore<Side> {
+template <class Kind>
+class LoadFailure : public RecordStore<Kind> {
 protected:
     void SetUp() override {
-        RecordStore<Side>::SetUp();
-        write(this->path(), std::string("1\nA\n") + Side::defaultRecord);
+        RecordStore<Kind>::SetUp();
+        write(this->path(), std::string("1\nA\n") + Kind::defaultRecord);
     }
     void TearDown() override {
         insteadOfNaming = nullptr;
-        RecordStore<Side>::TearDown();
+        RecordStore<Kind>::TearDown();
     }
 };
 
-TYPED_TEST_SUITE(LoadFailure, Sides, SideNames);
+TYPED_TEST_SUITE(LoadFailure, RecordKinds, KindNames);
 
-TYPED_TEST(LoadFailure, LeavesAnEmptyTableAndIsToldAtErrorLevel) {
+TYPED_TEST(LoadFailure, LeavesAnEmptyTableAndIsLoggedAtErrorLevel) {
     insteadOfNaming = [] { throw std::runtime_error("no directory"); };
     agentEnvironment::forgetLog();
     typename TypeParam::Cache cache;
@@ -61,7 +60,7 @@ TYPED_TEST(LoadFailure, LeavesAnEmptyTableAndIsToldAtErrorLevel) {
     }
 }
 
-TYPED_TEST(LoadFailure, DoesNotHinderTheNextLoad) {
+TYPED_TEST(LoadFailure, DoesNotAffectTheNextLoad) {
     insteadOfNaming = [] { throw KO::FrameworkException("not now"); };
     { typename TypeParam::Cache failed; }
     insteadOfNaming = nullptr;

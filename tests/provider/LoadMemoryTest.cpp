@@ -1,6 +1,6 @@
-// Loading where memory is short. The program's own sysconf and operator new take the place of the system's.
+// Loading with little memory. The program replaces sysconf and operator new.
 
-#include "Sides.h"
+#include "RecordKinds.h"
 
 #include <dlfcn.h>
 #include <gmock/gmock.h>
@@ -14,7 +14,7 @@ namespace {
 
 constexpr std::size_t unlimited = std::numeric_limits<std::size_t>::max();
 
-/** Pages of physical memory; 0 for the machine's own. Size of the smallest allocation that is refused. */
+/** Physical memory in pages, 0 for that of the machine, and the minimum size of allocations that fail. */
 long physicalPages = 0;
 std::size_t refusedSize = unlimited;
 
@@ -47,19 +47,19 @@ namespace {
 using namespace providerTest;
 using testing::ElementsAre;
 
-template <class Side>
-class LoadMemory : public RecordStore<Side> {
+template <class Kind>
+class LoadMemory : public RecordStore<Kind> {
 protected:
-    using Cache = typename Side::Cache;
-    using Unit = typename Side::Unit;
+    using Cache = typename Kind::Cache;
+    using Unit = typename Kind::Unit;
 
     void TearDown() override {
         physicalPages = 0;
         refusedSize = unlimited;
-        RecordStore<Side>::TearDown();
+        RecordStore<Kind>::TearDown();
     }
 
-    /** Reduces the physical memory to about a number of records. @return how many fit exactly */
+    /** Limits the physical memory to about a number of records. @return the exact number of records that fit */
     static std::size_t holdRecords(std::size_t count) {
         const auto page = static_cast<std::size_t>(sysconf(_SC_PAGESIZE));
         physicalPages = static_cast<long>(count * sizeof(Unit) / page + 1);
@@ -69,51 +69,51 @@ protected:
     static std::string fileOf(std::size_t count) {
         std::string content = std::to_string(count) + "\n";
         for (std::size_t record = 0; record < count; ++record) {
-            content += "R" + std::to_string(record) + "\n" + Side::defaultRecord;
+            content += "R" + std::to_string(record) + "\n" + Kind::defaultRecord;
         }
         return content;
     }
 
-    /** Loads the file: the table stays empty, and the only record about it at error level says so on each channel. */
+    /** Loads the file. Expects an empty table and exactly one record at error level per channel, which reports that. */
     static void expectTooLarge(const std::string& content) {
-        write(RecordStore<Side>::path(), content);
+        write(RecordStore<Kind>::path(), content);
         agentEnvironment::forgetLog();
         Cache cache;
-        EXPECT_EQ(Side::count(cache), 0U);
+        EXPECT_EQ(Kind::count(cache), 0U);
         EXPECT_TRUE(cache.table.empty());
         EXPECT_EQ(cache.table.capacity(), 0U) << "the memory of the records read is released";
         for (const char* channel : {"log", "trace"}) {
             std::vector<std::string> failures;
             for (const LogRecord& record :
-                 recordsOf(Words<Side>::sourceFile, std::string(Side::name) + "Cache", channel)) {
+                 recordsOf(Words<Kind>::sourceFile, std::string(Kind::name) + "Cache", channel)) {
                 if (record.level == 3000) {
                     failures.push_back(withoutLine(record.text));
                 }
             }
             EXPECT_THAT(failures, ElementsAre(message("The records of the file do not fit into memory.",
-                                                      Words<Side>::sourceFile)));
+                                                      Words<Kind>::sourceFile)));
         }
     }
 };
 
-TYPED_TEST_SUITE(LoadMemory, Sides, SideNames);
+TYPED_TEST_SUITE(LoadMemory, RecordKinds, KindNames);
 
-TYPED_TEST(LoadMemory, LogsACountOfMoreRecordsThanMemoryHolds) {
+TYPED_TEST(LoadMemory, LogsACountOfRecordsThatExceedsMemory) {
     const std::size_t fitting = this->holdRecords(40);
     this->expectTooLarge(this->fileOf(fitting + 1));
 }
 
-TYPED_TEST(LoadMemory, LogsACountOfMoreCopiesThanMemoryHolds) {
+TYPED_TEST(LoadMemory, LogsACountOfCopiesThatExceedsMemory) {
     const std::size_t fitting = this->holdRecords(40);
     this->expectTooLarge(std::to_string(fitting) + "\n" + std::string(1000, 'x'));
 }
 
-TYPED_TEST(LoadMemory, LogsThatTheProcessIsRefusedTheMemory) {
+TYPED_TEST(LoadMemory, LogsAFailedAllocation) {
     refusedSize = 200 * sizeof(typename TypeParam::Unit);
     this->expectTooLarge(this->fileOf(200));
 }
 
-TYPED_TEST(LoadMemory, LoadsAllRecordsThatMemoryHoldsWithoutTheReserve) {
+TYPED_TEST(LoadMemory, LoadsAllRecordsIfMemoryIsTooSmallForTheReserve) {
     const std::size_t fitting = this->holdRecords(40);
     const auto cache = this->load(this->fileOf(fitting));
     EXPECT_EQ(TypeParam::count(*cache), fitting);
@@ -121,7 +121,7 @@ TYPED_TEST(LoadMemory, LoadsAllRecordsThatMemoryHoldsWithoutTheReserve) {
     EXPECT_EQ(cache->table.back().InstanceID, "R" + std::to_string(fitting - 1));
 }
 
-TYPED_TEST(LoadMemory, LoadsAllRecordsWhenTheProcessIsRefusedTheReserve) {
+TYPED_TEST(LoadMemory, LoadsAllRecordsIfTheAllocationOfTheReserveFails) {
     refusedSize = 200 * sizeof(typename TypeParam::Unit) + 1;
     const auto cache = this->load(this->fileOf(200));
     EXPECT_EQ(TypeParam::count(*cache), 200U);

@@ -1,6 +1,6 @@
-// Loading a record file of whatever content. It never fails.
+// Loading record files with any content, which never fails.
 
-#include "Sides.h"
+#include "RecordKinds.h"
 
 #include <gmock/gmock.h>
 #include <unistd.h>
@@ -13,20 +13,20 @@ namespace {
 using namespace providerTest;
 using testing::ElementsAre;
 
-template <class Side>
-class Loading : public RecordStore<Side> {
+template <class Kind>
+class Loading : public RecordStore<Kind> {
 protected:
-    using Cache = typename Side::Cache;
+    using Cache = typename Kind::Cache;
 
-    static std::string record(const std::string& identifier) { return identifier + "\n" + Side::defaultRecord; }
+    static std::string record(const std::string& identifier) { return identifier + "\n" + Kind::defaultRecord; }
 
     static void expectEmpty(Cache& cache) {
-        EXPECT_EQ(Side::count(cache), 0U);
+        EXPECT_EQ(Kind::count(cache), 0U);
         EXPECT_TRUE(cache.table.empty());
     }
 
     static std::vector<std::string> identifiers(Cache& cache) {
-        EXPECT_EQ(Side::count(cache), cache.table.size());
+        EXPECT_EQ(Kind::count(cache), cache.table.size());
         std::vector<std::string> found;
         for (const auto& unit : cache.table) {
             EXPECT_TRUE(unit.inUse);
@@ -36,35 +36,35 @@ protected:
     }
 };
 
-TYPED_TEST_SUITE(Loading, Sides, SideNames);
+TYPED_TEST_SUITE(Loading, RecordKinds, KindNames);
 
-TYPED_TEST(Loading, OfAnAbsentFileGivesAnEmptyTableAndMakesNoFile) {
+TYPED_TEST(Loading, OfAMissingFileYieldsAnEmptyTableAndCreatesNoFile) {
     typename TypeParam::Cache cache;
     this->expectEmpty(cache);
     EXPECT_FALSE(std::filesystem::exists(this->path()));
 }
 
-/** Every way to a property, of which each throws this. */
-template <class Side>
-void expectNoProperty(typename Side::Base& base, const std::string& refusal) {
+/** Expects every property accessor to throw this message. */
+template <class Kind>
+void expectNoProperty(typename Kind::Base& base, const std::string& refusal) {
     std::string text = "before";
     unsigned int number = 7;
     const auto expectRefused = [&](auto access) { EXPECT_EQ(thrown<InstrumentationException>(access), refusal); };
-    expectRefused([&] { base.getProperty(Side::Property::InstanceID, text); });
-    expectRefused([&] { base.getProperty(Side::text, text); });
-    expectRefused([&] { base.getProperty(Side::number, number); });
-    expectRefused([&] { base.setProperty(Side::text, text); });
-    expectRefused([&] { base.setProperty(Side::number, number); });
-    if constexpr (std::is_same_v<Side, LeaseSide>) {
+    expectRefused([&] { base.getProperty(Kind::Property::InstanceID, text); });
+    expectRefused([&] { base.getProperty(Kind::text, text); });
+    expectRefused([&] { base.getProperty(Kind::number, number); });
+    expectRefused([&] { base.setProperty(Kind::text, text); });
+    expectRefused([&] { base.setProperty(Kind::number, number); });
+    if constexpr (std::is_same_v<Kind, LeaseKind>) {
         bool flag = true;
-        expectRefused([&] { base.getProperty(Side::Property::RenewalOption, flag); });
-        expectRefused([&] { base.setProperty(Side::Property::RenewalOption, flag); });
+        expectRefused([&] { base.getProperty(Kind::Property::RenewalOption, flag); });
+        expectRefused([&] { base.setProperty(Kind::Property::RenewalOption, flag); });
     }
     EXPECT_EQ(text, "before");
     EXPECT_EQ(number, 7U);
 }
 
-TYPED_TEST(Loading, OfNoFileLeavesCursorsAtTheEndWhereNoPropertyIsAvailable) {
+TYPED_TEST(Loading, OfAMissingFileLeavesCursorsAtTheEnd) {
     typename TypeParam::Cache loaded;
     this->expectEmpty(loaded);
     this->table().swap(loaded.table);
@@ -78,29 +78,29 @@ TYPED_TEST(Loading, OfNoFileLeavesCursorsAtTheEndWhereNoPropertyIsAvailable) {
     EXPECT_FALSE(std::filesystem::exists(this->path()));
 }
 
-TYPED_TEST(Loading, OfAFileThatCountsZeroIsTheSameAsOfNone) {
+TYPED_TEST(Loading, OfACountOfZeroEqualsAMissingFile) {
     for (const char* content : {"0\n", "0", "0\nA\nB\n", "  \n\n0\n"}) {
         this->expectEmpty(*this->load(content));
     }
 }
 
-TYPED_TEST(Loading, OfAnEmptyFileGivesAnEmptyTable) {
+TYPED_TEST(Loading, OfAnEmptyFileYieldsAnEmptyTable) {
     for (const char* content : {"", "\n", " \t\n\n"}) {
         this->expectEmpty(*this->load(content));
     }
 }
 
-TYPED_TEST(Loading, GivesTheRecordsInFileOrder) {
+TYPED_TEST(Loading, YieldsTheRecordsInFileOrder) {
     const auto cache = this->load("3\n" + this->record("C") + this->record("A") + this->record("B"));
     EXPECT_THAT(this->identifiers(*cache), ElementsAre("C", "A", "B"));
 }
 
-TYPED_TEST(Loading, MakesRoomForTenRecordsAndForTwiceAsManyAsAreCounted) {
+TYPED_TEST(Loading, ReservesTenRecordsOrTwiceTheCount) {
     EXPECT_GE(this->load("0\n")->table.capacity(), 10U);
     EXPECT_GE(this->load("11\n")->table.capacity(), 22U);
 }
 
-TYPED_TEST(Loading, GivesManyRecords) {
+TYPED_TEST(Loading, YieldsManyRecords) {
     std::string content = "25\n";
     std::vector<std::string> expected;
     for (int number = 0; number < 25; ++number) {
@@ -115,20 +115,20 @@ TYPED_TEST(Loading, IgnoresRecordsBeyondTheCount) {
     EXPECT_THAT(this->identifiers(*cache), ElementsAre("A"));
 }
 
-TYPED_TEST(Loading, GivesTheDeclaredNumberOfRecordsForAShorterFile) {
+TYPED_TEST(Loading, YieldsTheDeclaredNumberOfRecordsForAShorterFile) {
     const auto cache = this->load("4\n" + this->record("A") + this->record("B"));
     EXPECT_THAT(this->identifiers(*cache), ElementsAre("A", "B", "B", "B"));
     EXPECT_EQ(TypeParam::members(cache->table[3]), TypeParam::members(cache->table[1]));
 }
 
-TYPED_TEST(Loading, GivesTheDeclaredNumberOfDefaultRecordsForACountAlone) {
+TYPED_TEST(Loading, YieldsTheDeclaredNumberOfDefaultRecordsForACountAlone) {
     const auto cache = this->load("2\n");
     EXPECT_THAT(this->identifiers(*cache), ElementsAre("", ""));
     const typename TypeParam::Unit defaults;
     EXPECT_EQ(TypeParam::members(cache->table[0]), TypeParam::members(defaults));
 }
 
-TYPED_TEST(Loading, KeepsTheValuesOfTheRecordBeforeForMissingFields) {
+TYPED_TEST(Loading, RepeatsValuesOfThePrecedingRecordForMissingFields) {
     const std::string date = "20240101000000.000000+000";
     const bool isLease = TypeParam::linesOfRecord == 13;
     const std::string rest = isLease ? "1\n1\n1\n1\n11\n12\n13\n14\n2\n" : "";
@@ -141,13 +141,13 @@ TYPED_TEST(Loading, KeepsTheValuesOfTheRecordBeforeForMissingFields) {
     EXPECT_EQ(TypeParam::members(cache->table.at(1)), TypeParam::members(expected));
 }
 
-TYPED_TEST(Loading, TakesTheLastRecordWithoutItsLineFeed) {
+TYPED_TEST(Loading, AcceptsAMissingLineFeedAtTheEnd) {
     std::string content = "1\n" + this->record("A");
     content.pop_back();
     EXPECT_THAT(this->identifiers(*this->load(content)), ElementsAre("A"));
 }
 
-TYPED_TEST(Loading, TakesCarriageReturnsAsWhiteSpace) {
+TYPED_TEST(Loading, TreatsCarriageReturnsAsWhiteSpace) {
     std::string content;
     for (const std::string& line : linesOf("2\n" + this->record("A_1") + this->record("B"))) {
         content += line + "\r\n";
@@ -157,13 +157,13 @@ TYPED_TEST(Loading, TakesCarriageReturnsAsWhiteSpace) {
     EXPECT_EQ(cache->table[0].*TypeParam::date().member, "00000000000000.000000-000");
 }
 
-TYPED_TEST(Loading, TakesAnyWhiteSpaceBetweenFields) {
+TYPED_TEST(Loading, AcceptsAnyWhiteSpaceBetweenFields) {
     const auto cache = this->load("\t1 \v A\f Ay_Co\n\n 20240101000000.000000+000 7");
     EXPECT_THAT(this->identifiers(*cache), ElementsAre("A"));
     EXPECT_EQ(cache->table[0].*TypeParam::numberMember, 7U);
 }
 
-TYPED_TEST(Loading, TakesACountWithLeadingZerosAsDecimal) {
+TYPED_TEST(Loading, ReadsACountWithLeadingZerosAsDecimal) {
     EXPECT_EQ(this->identifiers(*this->load("012\n")).size(), 12U);
 }
 
@@ -172,8 +172,8 @@ TYPED_TEST(Loading, ReadsACountWithAPlusSign) {
     EXPECT_THAT(this->identifiers(*cache), ElementsAre("A", "B"));
 }
 
-/** The next change writes back all that was read, so a sign that ended the reading would lose the records after it. */
-TYPED_TEST(Loading, ReadsANumberWithAPlusSignAndTheRecordsBehindIt) {
+/** The next change writes all records back, so a sign that stopped reading would lose the following records. */
+TYPED_TEST(Loading, ReadsANumberWithAPlusSignAndTheFollowingRecords) {
     const auto sound = this->load("2\n" + this->record("A") + this->record("B"));
     for (const auto& number : TypeParam::numbers()) {
         auto lines = linesOf(this->record("A"));
@@ -189,7 +189,7 @@ TYPED_TEST(Loading, ReadsANumberWithAPlusSignAndTheRecordsBehindIt) {
     }
 }
 
-TYPED_TEST(Loading, OfACountThatIsNoUnsignedNumberGivesAnEmptyTable) {
+TYPED_TEST(Loading, OfAnInvalidCountYieldsAnEmptyTable) {
     for (const char* count :
          {"-1", "-0", "+", "+-1", "x", "true", "*", "4294967296", "99999999999999999999999", "0x10", ".5"}) {
         SCOPED_TRACE(count);
@@ -197,15 +197,15 @@ TYPED_TEST(Loading, OfACountThatIsNoUnsignedNumberGivesAnEmptyTable) {
     }
 }
 
-TYPED_TEST(Loading, OfACountThatMemoryCannotHoldGivesAnEmptyTable) {
+TYPED_TEST(Loading, OfACountThatExceedsMemoryYieldsAnEmptyTable) {
     for (const char* count : {"4294967295", "2147483648", "2147483649", "3000000000"}) {
         SCOPED_TRACE(count);
         this->expectEmpty(*this->load(count + std::string("\n") + this->record("A")));
     }
 }
 
-/** A file that ends within its first record, whose copies would fill the memory of the machine by their text alone. */
-TYPED_TEST(Loading, OfACountOfCopiesThatMemoryCannotHoldGivesAnEmptyTable) {
+/** The file ends within its first record, whose copies would exceed the machine's memory because of their strings. */
+TYPED_TEST(Loading, OfCopiesThatExceedMemoryYieldsAnEmptyTable) {
     constexpr std::size_t length = 64U << 20U;
     const auto memory =
         static_cast<std::size_t>(sysconf(_SC_PHYS_PAGES)) * static_cast<std::size_t>(sysconf(_SC_PAGESIZE));
@@ -215,32 +215,32 @@ TYPED_TEST(Loading, OfACountOfCopiesThatMemoryCannotHoldGivesAnEmptyTable) {
     EXPECT_LE(cache.table.capacity(), 10U);
 }
 
-TYPED_TEST(Loading, OfACountOfCopiesThatMemoryCanHoldGivesThemAll) {
+TYPED_TEST(Loading, OfCopiesThatFitIntoMemoryYieldsThemAll) {
     const std::string text(1U << 10U, 'x');
     write(this->path(), "1000\n" + text);
     typename TypeParam::Cache cache;
     EXPECT_EQ(this->identifiers(cache), std::vector<std::string>(1000, text));
 }
 
-TYPED_TEST(Loading, OfADirectoryGivesAnEmptyTable) {
+TYPED_TEST(Loading, OfADirectoryYieldsAnEmptyTable) {
     blockWithDirectory(this->path());
     typename TypeParam::Cache cache;
     this->expectEmpty(cache);
 }
 
-TYPED_TEST(Loading, OfAFileThatCannotBeOpenedGivesAnEmptyTable) {
+TYPED_TEST(Loading, OfAFileThatCannotBeOpenedYieldsAnEmptyTable) {
     std::filesystem::create_symlink(this->path(), this->path());
     typename TypeParam::Cache cache;
     this->expectEmpty(cache);
 }
 
-TYPED_TEST(Loading, WithoutADataDirectoryGivesAnEmptyTable) {
+TYPED_TEST(Loading, WithoutADataDirectoryYieldsAnEmptyTable) {
     std::filesystem::remove_all(agentEnvironment::dataDirectory());
     typename TypeParam::Cache cache;
     this->expectEmpty(cache);
 }
 
-/** Bytes without rule, the same for the same seed. */
+/** Returns pseudorandom bytes that depend only on the seed. */
 std::string rubbish(unsigned int seed, std::size_t length) {
     std::string bytes;
     while (bytes.size() < length) {
@@ -250,7 +250,7 @@ std::string rubbish(unsigned int seed, std::size_t length) {
     return bytes;
 }
 
-TYPED_TEST(Loading, SurvivesRubbish) {
+TYPED_TEST(Loading, SurvivesRandomBytes) {
     for (unsigned int seed = 1; seed <= 20; ++seed) {
         SCOPED_TRACE(seed);
         const auto bare = this->load(rubbish(seed, 2000));
@@ -267,7 +267,7 @@ TYPED_TEST(Loading, SurvivesAVeryLongLine) {
     EXPECT_THAT(this->identifiers(*this->load("1\n" + this->record(longName))), ElementsAre(longName));
 }
 
-/** Groups digits, as the locale of a process may. */
+/** Groups digits, like the locale of some processes. */
 struct Grouping : std::numpunct<char> {
     char do_thousands_sep() const override { return '.'; }
     std::string do_grouping() const override { return "\3"; }
@@ -284,7 +284,7 @@ private:
     std::locale before;
 };
 
-TYPED_TEST(Loading, AndWritingKeepOutOfTheLocaleOfTheProcess) {
+TYPED_TEST(Loading, AndWritingIgnoreTheGlobalLocale) {
     const GlobalLocale grouping(std::locale(std::locale::classic(), new Grouping));
     typename TypeParam::Unit unit("A");
     unit.*TypeParam::numberMember = 1234567;
@@ -292,7 +292,7 @@ TYPED_TEST(Loading, AndWritingKeepOutOfTheLocaleOfTheProcess) {
     EXPECT_EQ(this->reread(unit).*TypeParam::numberMember, 1234567U);
 }
 
-TYPED_TEST(Loading, LeavesTheFileAloneAndSoDoesReleasingTheTable) {
+TYPED_TEST(Loading, AndReleasingTheTableDoNotChangeTheFile) {
     const std::string content = "2\n" + this->record("A") + "short";
     this->load(content)->table.clear();
     EXPECT_EQ(this->file(), content);

@@ -3,16 +3,16 @@
 #include <string>
 #include <vector>
 
-/** A logging library that keeps what it is given, whatever its level. */
+/** A logging library that stores all records, regardless of their level. */
 namespace logDouble {
 
-/** The text of each record, behind its channel: "log" or "trace". */
+/** The message of each record, prefixed with its channel: "log" or "trace". */
 extern std::vector<std::string> records;
 
-/** How many message buffers were made. */
+/** Number of constructed message buffers. */
 extern int buffersMade;
 
-/** The level up to which the library says that it admits records; only where it can tell. */
+/** Maximum level for which the library admits records, if it provides RZLogger::admits. */
 extern int admittedLevel;
 
 }  // namespace logDouble

@@ -23,13 +23,13 @@ extern std::string loggerCMPIAssetIDDetail;
 
 namespace {
 
-TEST(LoggerNames, OfTheAgentAndAssetElementsAreTheShorterOne) {
+TEST(LoggerNames, OfAgentAndAssetElementsAreShorter) {
     for (const std::string* name : {&loggerOstrelAgent, &loggerAssetIDDetails}) {
         EXPECT_EQ(*name, "Tarvik.LeaseWarrantyProvider");
     }
 }
 
-TEST(LoggerNames, OfAllOtherUnitsAreTheProviders) {
+TEST(LoggerNames, OfAllOtherFilesAreTheProviders) {
     for (const std::string* name :
          {&loggerLeaseAndWarrantyProvider, &loggerLeaseBase, &loggerWarrantyBase, &loggerLease, &loggerWarranty,
           &loggerLeaseSetting, &loggerWarrantySetting, &loggerCMPILAWComputerSystem, &loggerCMPILeaseSetting,

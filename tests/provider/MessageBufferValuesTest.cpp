@@ -1,4 +1,4 @@
-// The values of the provider's parameter lists, inserted into a message buffer itself, not into its stream view.
+// Values of the provider's parameter lists, inserted into a message buffer directly instead of its stream.
 
 #include "KO/Moniker.h"
 #include "LeaseBase.h"
@@ -21,7 +21,7 @@ using KO::LeaseWarrantyProvider::LeaseUnit;
 using KO::LeaseWarrantyProvider::WarrantyUnit;
 namespace Properties = KO::LeaseWarrantyProvider::Properties;
 
-/** A value inserted behind a label and before another value, as in a parameter list. */
+/** Returns a value inserted after a label and before another value, as in a parameter list. */
 template <class Value>
 std::string listed(const Value& value) {
     RZMessageBuffer buffer;
@@ -60,7 +60,7 @@ struct PointeeNames {
 
 TYPED_TEST_SUITE(MessageBufferPointer, Pointees, PointeeNames);
 
-TYPED_TEST(MessageBufferPointer, IsInsertedAsAnAddress) {
+TYPED_TEST(MessageBufferPointer, IsFormattedAsAnAddress) {
     TypeParam pointee{};
     TypeParam* pointer = &pointee;
     const TypeParam* pointerToConst = &pointee;
@@ -68,24 +68,24 @@ TYPED_TEST(MessageBufferPointer, IsInsertedAsAnAddress) {
     EXPECT_EQ(listed(pointerToConst), twice(this->addressOf(&pointee)));
 }
 
-TYPED_TEST(MessageBufferPointer, IsInsertedAsZeroWhenNull) {
+TYPED_TEST(MessageBufferPointer, IsFormattedAsZeroIfNull) {
     TypeParam* pointer = nullptr;
     EXPECT_EQ(listed(pointer), twice("0"));
 }
 
-TEST(MessageBufferValue, IsInsertedAsItsCharactersWhenItIsAString) {
+TEST(MessageBufferValue, FormatsAStringAsItsCharacters) {
     EXPECT_EQ(listed(std::string("ACME Co")), twice("ACME Co"));
     char characters[] = "in an array";
     EXPECT_EQ(listed(characters), twice("in an array"));
     EXPECT_EQ(listed<char*>(characters), twice("in an array"));
 }
 
-TEST(MessageBufferValue, IsInsertedAsItsNumberWhenItIsAProperty) {
+TEST(MessageBufferValue, FormatsAPropertyAsItsNumber) {
     EXPECT_EQ(listed(Properties::Lease::BargainRenewalOption), twice("12"));
     EXPECT_EQ(listed(Properties::Warranty::Duration), twice("3"));
 }
 
-TEST(MessageBufferValue, IsInsertedAsDigitsWhenItIsANumberOrAFlag) {
+TEST(MessageBufferValue, FormatsANumberOrAFlagAsDigits) {
     EXPECT_EQ(listed(4294967295U), twice("4294967295"));
     EXPECT_EQ(listed(true), twice("1"));
 }

@@ -1,4 +1,4 @@
-// Requests of a store that counts records and has none.
+// Requests to a store whose count is not 0 and whose table is empty.
 
 #include "RequestFixture.h"
 
@@ -12,7 +12,7 @@ using testing::IsEmpty;
 
 constexpr const char* entryFile = "LeaseAndWarrantyProvider.cpp";
 
-/** A class of records, its count in the store, and what is thrown when that is not true. */
+/** A record class, its count, and the exception message for a wrong count. */
 struct CountedStore {
     const char* className;
     unsigned int& count;
@@ -52,7 +52,7 @@ protected:
     }
 };
 
-TEST_F(MissingRecords, EndEveryEnumerationAsASuccessWithoutResults) {
+TEST_F(MissingRecords, EndEveryEnumerationSuccessfullyWithoutResults) {
     const CountedStore stores[] = {
         {"VELKO_Lease", LeaseBase::cache.recordCountLease, "LeaseBase.cpp", "LeaseBase",
          "Zero Lease Records Available"},

@@ -1,6 +1,6 @@
-// A computer without a name, before and behind those that are looked for.
+// An unnamed computer before and after those that are searched.
 
-#include "SettingSides.h"
+#include "SettingKinds.h"
 
 const char* const agentNodes = R"(
 [[instrumentation.node]]
@@ -23,9 +23,9 @@ namespace {
 
 using namespace providerTest;
 
-TYPED_TEST_SUITE(SettingElement, SettingSides, SideNames);
+TYPED_TEST_SUITE(SettingElement, SettingKinds, KindNames);
 
-TYPED_TEST(SettingElement, FailsOnANamelessComputerBeforeTheOneLookedFor) {
+TYPED_TEST(SettingElement, FailsOnAnUnnamedComputerBeforeTheMatch) {
     for (const char* name : {"behind", "nobody"}) {
         EXPECT_EQ(thrown<InstrumentationException>([&] {
                       this->toElement({{"Name", name}});
@@ -35,11 +35,11 @@ TYPED_TEST(SettingElement, FailsOnANamelessComputerBeforeTheOneLookedFor) {
     EXPECT_EQ(textsOf(TypeParam::elementFile, "setFilter").size(), 0U);
 }
 
-TYPED_TEST(SettingElement, DoesNotReachANamelessComputerBehindTheOneLookedFor) {
+TYPED_TEST(SettingElement, IgnoresAnUnnamedComputerAfterTheMatch) {
     EXPECT_EQ(this->toElement({{"Name", "before"}}), (Keys{{"InstanceID", "/first"}}));
 }
 
-TYPED_TEST(SettingElement, RefusesThePathOfANamelessComputer) {
+TYPED_TEST(SettingElement, RejectsThePathOfAnUnnamedComputer) {
     EXPECT_EQ(thrown<InstrumentationException>([&] {
                   this->toComputer({{"InstanceID", "/nameless"}});
               }),

@@ -5,7 +5,7 @@
 
 #include <gmock/gmock.h>
 
-/** With letters, whose case counts. */
+/** Contains letters, to test case-sensitivity. */
 const char* const agentVersion = "4.2.0-Beta";
 
 namespace {
@@ -51,7 +51,7 @@ TEST_F(OstrelAgentElement, DescribesTheAgentProduct) {
     EXPECT_EQ(agent.getStatus(), "OK");
 }
 
-TEST_F(OstrelAgentElement, BearsASuffixWhereTheMarkerFileIsPresent) {
+TEST_F(OstrelAgentElement, HasASuffixIfTheMarkerFileExists) {
     const OstrelAgent agent;
     write(marker(), "whatever");
     EXPECT_EQ(agent.getName(), "Test Agent Tarvik Agent");
@@ -63,14 +63,14 @@ TEST_F(OstrelAgentElement, BearsASuffixWhereTheMarkerFileIsPresent) {
     EXPECT_EQ(agent.getProductName(), "Test Agent");
 }
 
-TEST_F(OstrelAgentElement, BearsNoSuffixForAFileOfAnotherName) {
+TEST_F(OstrelAgentElement, HasNoSuffixIfAFileWithAnotherNameExists) {
     const auto other = agentEnvironment::installDirectory() / "version.LV1";
     write(other, "");
     EXPECT_EQ(OstrelAgent().getName(), "Test Agent");
     std::filesystem::remove(other);
 }
 
-TEST_F(OstrelAgentElement, IsExactlyOne) {
+TEST_F(OstrelAgentElement, ExistsExactlyOnce) {
     OstrelAgent agent;
     EXPECT_TRUE(stands(agent));
     EXPECT_TRUE(stands(agent));
@@ -80,7 +80,7 @@ TEST_F(OstrelAgentElement, IsExactlyOne) {
     EXPECT_FALSE(stands(agent));
 }
 
-TEST_F(OstrelAgentElement, AcceptsEachKeyOfItsOwnAndRefusesAnyOther) {
+TEST_F(OstrelAgentElement, AcceptsItsOwnKeysAndRejectsOthers) {
     const std::pair<int, std::string> keys[] = {
         {0, "Test Agent"}, {1, "ID-1"}, {2, "Test Agent"}, {3, "VEL"}, {4, "4.2.0-Beta"}};
     for (const auto& [type, value] : keys) {
@@ -93,14 +93,14 @@ TEST_F(OstrelAgentElement, AcceptsEachKeyOfItsOwnAndRefusesAnyOther) {
     }
 }
 
-TEST_F(OstrelAgentElement, ComparesKeysWithRegardToLetterCase) {
+TEST_F(OstrelAgentElement, ComparesKeysCaseSensitively) {
     EXPECT_EQ(refusal(OstrelAgent::FILTER_VENDOR, "vel"), "Could not find specified Agent.");
     EXPECT_EQ(refusal(OstrelAgent::FILTER_NAME, "TEST AGENT"), "Could not find specified Agent.");
     EXPECT_EQ(refusal(OstrelAgent::FILTER_IDENTIFYING_NUMBER, "id-1"), "Could not find specified Agent.");
     EXPECT_EQ(refusal(OstrelAgent::FILTER_VERSION, "4.2.0-beta"), "Could not find specified Agent.");
 }
 
-TEST_F(OstrelAgentElement, ComparesNamesWithTheSuffixWhereTheMarkerFileIsPresent) {
+TEST_F(OstrelAgentElement, ComparesNamesWithTheSuffixIfTheMarkerFileExists) {
     write(marker(), "");
     for (const int type : {OstrelAgent::FILTER_NAME, OstrelAgent::FILTER_PRODUCT_NAME}) {
         EXPECT_EQ(refusal(type, "Test Agent Tarvik Agent"), "");
@@ -108,13 +108,13 @@ TEST_F(OstrelAgentElement, ComparesNamesWithTheSuffixWhereTheMarkerFileIsPresent
     }
 }
 
-TEST_F(OstrelAgentElement, AcceptsAnyValueOfAKeyItDoesNotKnow) {
+TEST_F(OstrelAgentElement, AcceptsAnyValueOfAnUnknownKey) {
     for (const int type : {7, 5, -1, 2147483647}) {
         EXPECT_EQ(refusal(type, "anything"), "") << type;
     }
 }
 
-TEST_F(OstrelAgentElement, StaysAsItWasWhateverTheFilterSays) {
+TEST_F(OstrelAgentElement, IsUnchangedByFilters) {
     OstrelAgent agent;
     agent.setFilter(OstrelAgent::FILTER_VENDOR, "VEL");
     EXPECT_TRUE(stands(agent));
@@ -127,7 +127,7 @@ TEST_F(OstrelAgentElement, StaysAsItWasWhateverTheFilterSays) {
     EXPECT_FALSE(stands(agent));
 }
 
-TEST_F(OstrelAgentElement, TellsOfAFilterAtErrorLevel) {
+TEST_F(OstrelAgentElement, LogsFiltersAtErrorLevel) {
     OstrelAgent agent;
     agentEnvironment::forgetLog();
     agent.setFilter(OstrelAgent::FILTER_VERSION, "4.2.0-Beta");
@@ -140,7 +140,7 @@ TEST_F(OstrelAgentElement, TellsOfAFilterAtErrorLevel) {
     }
 }
 
-TEST_F(OstrelAgentElement, TellsWhyAFilterFailsAndNoExit) {
+TEST_F(OstrelAgentElement, LogsTheReasonOfAFailedFilterAndNoExit) {
     refusal(OstrelAgent::FILTER_VENDOR, "other");
     EXPECT_THAT(textsOf(sourceFile, "setFilter"),
                 ElementsAre(entering("setFilter", sourceFile, "FilterType=3 key_value=other"),
@@ -150,7 +150,7 @@ TEST_F(OstrelAgentElement, TellsWhyAFilterFailsAndNoExit) {
     }
 }
 
-TEST_F(OstrelAgentElement, TellsEntryAndExitOfItsOperations) {
+TEST_F(OstrelAgentElement, LogsEntryAndExitOfItsOperations) {
     agentEnvironment::forgetLog();
     OstrelAgent agent;
     EXPECT_TRUE(stands(agent));

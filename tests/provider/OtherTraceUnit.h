@@ -1,4 +1,4 @@
 #pragma once
 
-/** What the formatting functions of another source unit give. */
+/** Returns the result of another translation unit's formatting function. */
 const char* traceOfOtherUnit(const char* function);

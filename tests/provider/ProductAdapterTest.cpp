@@ -1,4 +1,4 @@
-// The adapters of the agent and of the asset identification, made for a namespace alone.
+// The adapters of the agent and of the asset identification, constructed from a namespace.
 
 #include "CMPIAssetIDDetail.h"
 #include "CMPIOstrelAgent.h"
@@ -22,7 +22,7 @@ using KO::LeaseWarrantyProvider::CMPIOstrelAgent;
 
 class ProductAdapter : public CleanAgent {
 protected:
-    /** The values of a key, and the namespaces, of the paths that an adapter walks over. */
+    /** The values of a key, and the namespaces, of an adapter's paths. */
     struct Walked {
         std::vector<std::string> keys{};
         std::vector<std::string> nameSpaces{};
@@ -48,7 +48,7 @@ protected:
     cimhost::RequestScope scope{broker};
 };
 
-TEST_F(ProductAdapter, OfANamespaceIsTheAgentWithoutACheckOfKeys) {
+TEST_F(ProductAdapter, OfANamespaceReturnsTheAgentWithoutComparingKeys) {
     const Walked found = walked<CMPIOstrelAgent>("Name");
     EXPECT_THAT(found.keys, ElementsAre("Test Agent"));
     EXPECT_THAT(found.nameSpaces, Each("root/elsewhere"));
@@ -57,7 +57,7 @@ TEST_F(ProductAdapter, OfANamespaceIsTheAgentWithoutACheckOfKeys) {
     EXPECT_THAT(textsOf("CMPIOstrelAgent.cpp", "setObjectPath"), IsEmpty());
 }
 
-TEST_F(ProductAdapter, OfANamespaceHasAnInstanceOfTheAssetDataForEveryComputer) {
+TEST_F(ProductAdapter, OfANamespaceReturnsOneAssetInstancePerComputer) {
     const Walked found = walked<CMPIAssetIDDetail>("Name");
     EXPECT_THAT(found.keys, ElementsAre("spaced", "tight", "dashless", "dash first", "dash second", "many dashes",
                                         "empty", "productless", "/system%20one"))

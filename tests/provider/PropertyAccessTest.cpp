@@ -1,6 +1,6 @@
-// Every property number with every type of access, for reading and for writing.
+// Reading and writing every property number with every type.
 
-#include "Sides.h"
+#include "RecordKinds.h"
 
 #include <type_traits>
 #include <variant>
@@ -16,11 +16,11 @@ constexpr const char* wrongTypeOfText = "Incorrect Type or Property or Property 
 template <class Unit>
 using Member = std::variant<std::monostate, std::string Unit::*, unsigned int Unit::*, bool Unit::*>;
 
-/** What stands behind each property number, from 0 up; numbers beside them mean nothing. */
-template <class Side>
-std::vector<Member<typename Side::Unit>> membersByNumber() {
-    using Unit = typename Side::Unit;
-    if constexpr (std::is_same_v<Side, LeaseSide>) {
+/** The member of each property number, starting at 0. Other numbers are invalid. */
+template <class Kind>
+std::vector<Member<typename Kind::Unit>> membersByNumber() {
+    using Unit = typename Kind::Unit;
+    if constexpr (std::is_same_v<Kind, LeaseKind>) {
         return {&Unit::InstanceID,
                 &Unit::LeaseTerm,
                 &Unit::NetMonthlyLeaseRateFactor,
@@ -39,17 +39,17 @@ std::vector<Member<typename Side::Unit>> membersByNumber() {
     }
 }
 
-template <class Side>
-class PropertyAccess : public RecordStore<Side> {
+template <class Kind>
+class PropertyAccess : public RecordStore<Kind> {
 protected:
-    using Property = typename Side::Property;
-    using Unit = typename Side::Unit;
-    using Base = typename Side::Base;
+    using Property = typename Kind::Property;
+    using Unit = typename Kind::Unit;
+    using Base = typename Kind::Base;
 
-    /** Numbers with a property, and others around them. */
+    /** Returns the valid property numbers and some invalid ones. */
     static std::vector<int> numbers() {
         std::vector<int> found = {-2147483647 - 1, -1, 100, 2147483647};
-        const int count = static_cast<int>(membersByNumber<Side>().size());
+        const int count = static_cast<int>(membersByNumber<Kind>().size());
         for (int number = 0; number <= count; ++number) {
             found.push_back(number);
         }
@@ -57,12 +57,12 @@ protected:
     }
 
     static Member<Unit> memberOf(int number) {
-        const auto members = membersByNumber<Side>();
+        const auto members = membersByNumber<Kind>();
         const auto index = static_cast<std::size_t>(number);
         return number >= 0 && index < members.size() ? members[index] : Member<Unit>();
     }
 
-    /** The member that access of a type reaches, null if the access is wrong. */
+    /** Returns the member that a property of a type accesses; null if the access is invalid. */
     template <class Value>
     static Value Unit::*reached(int number) {
         const Member<Unit> member = memberOf(number);
@@ -103,7 +103,7 @@ protected:
             EXPECT_EQ(thrown<InstrumentationException>(set), writable ? "" : refusal);
         }
         for (std::size_t index = 0; index < expected.size(); ++index) {
-            EXPECT_EQ(Side::members(this->table()[index]), Side::members(expected[index])) << index;
+            EXPECT_EQ(Kind::members(this->table()[index]), Kind::members(expected[index])) << index;
         }
         EXPECT_EQ(std::filesystem::exists(this->path()), writable) << "the file is written after a change only";
     }
@@ -117,44 +117,44 @@ protected:
         Value value = sentinel;
         const auto property = static_cast<Property>(number);
         EXPECT_EQ(thrown<InstrumentationException>([&] { base.getProperty(property, value); }),
-                  Words<Side>::notAvailable);
+                  Words<Kind>::notAvailable);
         EXPECT_EQ(value, sentinel);
         EXPECT_EQ(thrown<InstrumentationException>([&] { base.setProperty(property, sentinel); }),
-                  Words<Side>::notAvailable);
+                  Words<Kind>::notAvailable);
     }
 };
 
-TYPED_TEST_SUITE(PropertyAccess, Sides, SideNames);
+TYPED_TEST_SUITE(PropertyAccess, RecordKinds, KindNames);
 
-TYPED_TEST(PropertyAccess, ReadsTextsAndRefusesAllElse) {
+TYPED_TEST(PropertyAccess, ReadsStringsAndRejectsOtherProperties) {
     for (const int number : this->numbers()) {
         SCOPED_TRACE(number);
         this->template expectGet<std::string>(number, "untouched", "stored text");
     }
 }
 
-TYPED_TEST(PropertyAccess, ReadsNumbersAndRefusesAllElse) {
+TYPED_TEST(PropertyAccess, ReadsNumbersAndRejectsOtherProperties) {
     for (const int number : this->numbers()) {
         SCOPED_TRACE(number);
         this->template expectGet<unsigned int>(number, 12345U, 4294967295U);
     }
 }
 
-TYPED_TEST(PropertyAccess, WritesTextsButTheIdentifierAndRefusesAllElse) {
+TYPED_TEST(PropertyAccess, WritesStringsExceptTheIdentifierAndRejectsOtherProperties) {
     for (const int number : this->numbers()) {
         SCOPED_TRACE(number);
         this->template expectSet<std::string>(number, "stored text", wrongTypeOfText);
     }
 }
 
-TYPED_TEST(PropertyAccess, WritesNumbersAndRefusesAllElse) {
+TYPED_TEST(PropertyAccess, WritesNumbersAndRejectsOtherProperties) {
     for (const int number : this->numbers()) {
         SCOPED_TRACE(number);
         this->template expectSet<unsigned int>(number, 4294967295U, wrongTypeOfNumber);
     }
 }
 
-TYPED_TEST(PropertyAccess, IsRefusedAtTheEndWhateverThePropertyAndType) {
+TYPED_TEST(PropertyAccess, IsRejectedAtTheEnd) {
     for (const int number : this->numbers()) {
         SCOPED_TRACE(number);
         this->template expectNothingAtTheEnd<std::string>(number, "untouched");
@@ -162,7 +162,7 @@ TYPED_TEST(PropertyAccess, IsRefusedAtTheEndWhateverThePropertyAndType) {
     }
 }
 
-TYPED_TEST(PropertyAccess, ReachesADeletedRecordThatTheCursorStandsOn) {
+TYPED_TEST(PropertyAccess, AccessesADeletedCurrentRecord) {
     this->fill({"A"});
     typename TypeParam::Base base;
     TypeParam::remove(base);
@@ -172,9 +172,9 @@ TYPED_TEST(PropertyAccess, ReachesADeletedRecordThatTheCursorStandsOn) {
     EXPECT_EQ(text, "late");
 }
 
-using LeaseFlagAccess = PropertyAccess<LeaseSide>;
+using LeaseFlagAccess = PropertyAccess<LeaseKind>;
 
-TEST_F(LeaseFlagAccess, ReadsFlagsAndRefusesAllElse) {
+TEST_F(LeaseFlagAccess, ReadsFlagsAndRejectsOtherProperties) {
     for (const int number : numbers()) {
         SCOPED_TRACE(number);
         expectGet<bool>(number, false, true);
@@ -182,14 +182,14 @@ TEST_F(LeaseFlagAccess, ReadsFlagsAndRefusesAllElse) {
     }
 }
 
-TEST_F(LeaseFlagAccess, WritesFlagsAndRefusesAllElse) {
+TEST_F(LeaseFlagAccess, WritesFlagsAndRejectsOtherProperties) {
     for (const int number : numbers()) {
         SCOPED_TRACE(number);
         expectSet<bool>(number, true, wrongType);
     }
 }
 
-TEST_F(LeaseFlagAccess, IsRefusedAtTheEndWhateverTheProperty) {
+TEST_F(LeaseFlagAccess, IsRejectedAtTheEnd) {
     for (const int number : numbers()) {
         SCOPED_TRACE(number);
         expectNothingAtTheEnd<bool>(number, true);
@@ -205,8 +205,8 @@ constexpr bool readsFlags<Base, Property,
     true;
 
 TEST(WarrantyFlagAccess, IsNotOffered) {
-    EXPECT_TRUE((readsFlags<LeaseBase, LeaseSide::Property>));
-    EXPECT_FALSE((readsFlags<WarrantyBase, WarrantySide::Property>));
+    EXPECT_TRUE((readsFlags<LeaseBase, LeaseKind::Property>));
+    EXPECT_FALSE((readsFlags<WarrantyBase, WarrantyKind::Property>));
 }
 
 }  // namespace

@@ -1,6 +1,6 @@
-// Records made and deleted.
+// Creation and deletion of records.
 
-#include "Sides.h"
+#include "RecordKinds.h"
 
 #include <gmock/gmock.h>
 
@@ -9,23 +9,23 @@ namespace {
 using namespace providerTest;
 using testing::ElementsAre;
 
-template <class Side>
-class RecordCreation : public RecordStore<Side> {
+template <class Kind>
+class RecordCreation : public RecordStore<Kind> {
 protected:
-    /** Identifier of each table entry; deleted ones with a bar in front. */
+    /** Returns the identifier of each table entry, prefixed with a bar if the entry is deleted. */
     static std::vector<std::string> entries() {
         std::vector<std::string> found;
         unsigned int inUse = 0;
-        for (const auto& unit : RecordStore<Side>::table()) {
+        for (const auto& unit : RecordStore<Kind>::table()) {
             found.push_back((unit.inUse ? "" : "|") + unit.InstanceID);
             inUse += unit.inUse ? 1U : 0U;
         }
-        EXPECT_EQ(RecordStore<Side>::count(), inUse);
+        EXPECT_EQ(RecordStore<Kind>::count(), inUse);
         return found;
     }
 };
 
-TYPED_TEST_SUITE(RecordCreation, Sides, SideNames);
+TYPED_TEST_SUITE(RecordCreation, RecordKinds, KindNames);
 
 TYPED_TEST(RecordCreation, AppendsARecordWithDefaults) {
     this->fill({"A"});
@@ -36,7 +36,7 @@ TYPED_TEST(RecordCreation, AppendsARecordWithDefaults) {
     EXPECT_EQ(TypeParam::members(this->table()[1]), TypeParam::members(expected));
 }
 
-TYPED_TEST(RecordCreation, LeavesTheCursorOnTheNewRecordWhenItStoodOnOne) {
+TYPED_TEST(RecordCreation, MovesTheCursorFromARecordToTheNewOne) {
     this->fill({"A", "B"});
     typename TypeParam::Base base;
     ++base;
@@ -46,7 +46,7 @@ TYPED_TEST(RecordCreation, LeavesTheCursorOnTheNewRecordWhenItStoodOnOne) {
     EXPECT_FALSE(stands(base));
 }
 
-TYPED_TEST(RecordCreation, LeavesTheCursorOnTheFirstEntryWhenItStoodAtTheEnd) {
+TYPED_TEST(RecordCreation, MovesTheCursorFromTheEndToTheFirstEntry) {
     this->fill({"A", "B"});
     typename TypeParam::Base base;
     TypeParam::select(base, "nowhere");
@@ -54,7 +54,7 @@ TYPED_TEST(RecordCreation, LeavesTheCursorOnTheFirstEntryWhenItStoodAtTheEnd) {
     EXPECT_EQ(this->identifier(base), "A");
 }
 
-TYPED_TEST(RecordCreation, LeavesTheCursorOnTheOnlyRecordOfAnEmptyTable) {
+TYPED_TEST(RecordCreation, MovesTheCursorToTheOnlyRecord) {
     typename TypeParam::Base base;
     TypeParam::create(base, "A");
     EXPECT_EQ(this->identifier(base), "A");
@@ -62,7 +62,7 @@ TYPED_TEST(RecordCreation, LeavesTheCursorOnTheOnlyRecordOfAnEmptyTable) {
     EXPECT_EQ(this->identifier(base), "A");
 }
 
-TYPED_TEST(RecordCreation, LeavesTheCursorOnADeletedFirstEntryWhenItStoodAtTheEnd) {
+TYPED_TEST(RecordCreation, MovesTheCursorFromTheEndToADeletedFirstEntry) {
     this->fill({"A", "B"});
     this->markDeleted(0);
     this->markDeleted(1);
@@ -73,7 +73,7 @@ TYPED_TEST(RecordCreation, LeavesTheCursorOnADeletedFirstEntryWhenItStoodAtTheEn
     EXPECT_EQ(this->identifier(base), "C");
 }
 
-TYPED_TEST(RecordCreation, FindsTheNewRecordFromADeletedOne) {
+TYPED_TEST(RecordCreation, MovesTheCursorFromADeletedRecordToTheNewOne) {
     this->fill({"A"});
     typename TypeParam::Base base;
     TypeParam::remove(base);
@@ -82,7 +82,7 @@ TYPED_TEST(RecordCreation, FindsTheNewRecordFromADeletedOne) {
     EXPECT_THAT(this->entries(), ElementsAre("|A", "B"));
 }
 
-TYPED_TEST(RecordCreation, RefusesAnIdentifierInUseAndChangesNothing) {
+TYPED_TEST(RecordCreation, RejectsAnIdentifierInUseAndChangesNothing) {
     this->fill({"A", "B"});
     {
         typename TypeParam::Base base;
@@ -96,7 +96,7 @@ TYPED_TEST(RecordCreation, RefusesAnIdentifierInUseAndChangesNothing) {
     EXPECT_FALSE(std::filesystem::exists(this->path()));
 }
 
-TYPED_TEST(RecordCreation, RefusesAnIdentifierInUseBeforeTheCursorToo) {
+TYPED_TEST(RecordCreation, RejectsAnIdentifierInUseBeforeTheCursor) {
     this->fill({"A", "B"});
     typename TypeParam::Base base;
     TypeParam::select(base, "nowhere");
@@ -113,7 +113,7 @@ TYPED_TEST(RecordCreation, ComparesIdentifiersByteForByte) {
     EXPECT_THAT(this->entries(), ElementsAre("A", "a", "A ", " A", "", "AA"));
 }
 
-TYPED_TEST(RecordCreation, TakesTheIdentifierOfADeletedRecord) {
+TYPED_TEST(RecordCreation, AcceptsTheIdentifierOfADeletedRecord) {
     this->fill({"A", "B"});
     typename TypeParam::Base base;
     TypeParam::remove(base);
@@ -123,7 +123,7 @@ TYPED_TEST(RecordCreation, TakesTheIdentifierOfADeletedRecord) {
     EXPECT_FALSE(stands(base));
 }
 
-TYPED_TEST(RecordCreation, IsWrittenWhenTheCursorEnds) {
+TYPED_TEST(RecordCreation, IsWrittenWhenTheCursorIsDestroyed) {
     {
         typename TypeParam::Base base;
         TypeParam::create(base, "A");
@@ -133,7 +133,7 @@ TYPED_TEST(RecordCreation, IsWrittenWhenTheCursorEnds) {
     EXPECT_EQ(this->file(), std::string("2\nA\n") + TypeParam::defaultRecord + "B\n" + TypeParam::defaultRecord);
 }
 
-TYPED_TEST(RecordCreation, AndDeletionLeaveNothingButTheCountInTheFile) {
+TYPED_TEST(RecordCreation, AndDeletionLeaveOnlyTheCountInTheFile) {
     {
         typename TypeParam::Base base;
         TypeParam::create(base, "A");
@@ -149,7 +149,7 @@ TYPED_TEST(RecordCreation, AndDeletionLeaveNothingButTheCountInTheFile) {
     EXPECT_FALSE(stands(fresh));
 }
 
-TYPED_TEST(RecordCreation, OfDeletedRecordsIsForTheTableOnly) {
+TYPED_TEST(RecordCreation, OfDeletedRecordsIsNotWritten) {
     this->fill({"A", "B", "C"});
     {
         typename TypeParam::Base base;
@@ -160,7 +160,7 @@ TYPED_TEST(RecordCreation, OfDeletedRecordsIsForTheTableOnly) {
     EXPECT_EQ(this->file(), std::string("2\nA\n") + TypeParam::defaultRecord + "C\n" + TypeParam::defaultRecord);
 }
 
-TYPED_TEST(RecordCreation, DeletionLeavesTheCursorWhereItIs) {
+TYPED_TEST(RecordCreation, DeletionDoesNotMoveTheCursor) {
     this->fill({"A", "B"});
     typename TypeParam::Base base;
     TypeParam::remove(base);
@@ -172,7 +172,7 @@ TYPED_TEST(RecordCreation, DeletionLeavesTheCursorWhereItIs) {
     EXPECT_EQ(this->identifier(base), "B");
 }
 
-TYPED_TEST(RecordCreation, ARecordDeletedTwiceIsCountedDownOnce) {
+TYPED_TEST(RecordCreation, ASecondDeletionDoesNotChangeTheCount) {
     this->fill({"A", "B", "C"});
     {
         typename TypeParam::Base base;
@@ -184,7 +184,7 @@ TYPED_TEST(RecordCreation, ARecordDeletedTwiceIsCountedDownOnce) {
     EXPECT_EQ(this->file(), std::string("2\nB\n") + TypeParam::defaultRecord + "C\n" + TypeParam::defaultRecord);
 }
 
-TYPED_TEST(RecordCreation, DeletionAtTheEndIsRefused) {
+TYPED_TEST(RecordCreation, DeletionAtTheEndThrows) {
     this->fill({"A"});
     {
         typename TypeParam::Base base;

@@ -1,6 +1,6 @@
-// Where a cursor over the records stands, and how it moves.
+// Position and movement of a cursor over the records.
 
-#include "Sides.h"
+#include "RecordKinds.h"
 
 #include <gmock/gmock.h>
 
@@ -9,28 +9,28 @@ namespace {
 using namespace providerTest;
 using testing::ElementsAre;
 
-template <class Side>
-class RecordCursor : public RecordStore<Side> {
+template <class Kind>
+class RecordCursor : public RecordStore<Kind> {
 protected:
-    /** The identifiers from the current record on, in the order of the walk. */
-    static std::vector<std::string> walked(typename Side::Base& base) {
+    /** Returns the identifiers from the current record on. */
+    static std::vector<std::string> walked(typename Kind::Base& base) {
         std::vector<std::string> identifiers;
         for (; base; ++base) {
-            identifiers.push_back(RecordStore<Side>::identifier(base));
+            identifiers.push_back(RecordStore<Kind>::identifier(base));
         }
         return identifiers;
     }
 };
 
-TYPED_TEST_SUITE(RecordCursor, Sides, SideNames);
+TYPED_TEST_SUITE(RecordCursor, RecordKinds, KindNames);
 
-TYPED_TEST(RecordCursor, StandsAtTheEndOfAnEmptyTable) {
+TYPED_TEST(RecordCursor, StartsAtTheEndOfAnEmptyTable) {
     typename TypeParam::Base base;
     EXPECT_FALSE(stands(base));
     EXPECT_TRUE(this->atEnd(base));
 }
 
-TYPED_TEST(RecordCursor, StandsOnTheFirstRecordInUse) {
+TYPED_TEST(RecordCursor, StartsAtTheFirstRecordInUse) {
     this->fill({"A", "B", "C"});
     this->markDeleted(0);
     typename TypeParam::Base base;
@@ -38,7 +38,7 @@ TYPED_TEST(RecordCursor, StandsOnTheFirstRecordInUse) {
     EXPECT_TRUE(stands(base));
 }
 
-TYPED_TEST(RecordCursor, StandsAtTheEndWhenNoRecordIsCounted) {
+TYPED_TEST(RecordCursor, StartsAtTheEndIfTheCountIsZero) {
     this->fill({"A"});
     this->count() = 0;
     typename TypeParam::Base base;
@@ -46,12 +46,12 @@ TYPED_TEST(RecordCursor, StandsAtTheEndWhenNoRecordIsCounted) {
     EXPECT_FALSE(stands(base));
 }
 
-TYPED_TEST(RecordCursor, CannotBeMadeWhenRecordsAreCountedAndThereAreNone) {
+TYPED_TEST(RecordCursor, ThrowsIfTheCountIsNotZeroAndTheTableIsEmpty) {
     this->count() = 1;
     EXPECT_EQ(thrown<InstrumentationException>([] { typename TypeParam::Base base; }), Words<TypeParam>::noRecords);
 }
 
-TYPED_TEST(RecordCursor, CannotBeMadeWhenRecordsAreCountedAndAllAreDeleted) {
+TYPED_TEST(RecordCursor, ThrowsIfTheCountIsNotZeroAndAllRecordsAreDeleted) {
     this->fill({"A", "B"});
     this->markDeleted(0);
     this->markDeleted(1);
@@ -84,7 +84,7 @@ TYPED_TEST(RecordCursor, StaysAtTheEnd) {
     EXPECT_TRUE(this->atEnd(base));
 }
 
-TYPED_TEST(RecordCursor, DoesNotReturnFromTheEndWhenARecordIsAppended) {
+TYPED_TEST(RecordCursor, StaysAtTheEndWhenARecordIsAppended) {
     this->fill({"A"});
     typename TypeParam::Base base;
     ++base;
@@ -92,7 +92,7 @@ TYPED_TEST(RecordCursor, DoesNotReturnFromTheEndWhenARecordIsAppended) {
     EXPECT_FALSE(stands(base));
 }
 
-TYPED_TEST(RecordCursor, MovesOffADeletedRecordWhenAskedWhetherItStandsOnOne) {
+TYPED_TEST(RecordCursor, MovesFromADeletedRecordWhenItIsTested) {
     this->fill({"A", "B", "C"});
     typename TypeParam::Base base;
     this->markDeleted(0);
@@ -120,7 +120,7 @@ TYPED_TEST(RecordCursor, SelectsARecordByItsIdentifier) {
     EXPECT_THAT(this->walked(base), ElementsAre("B", "C"));
 }
 
-TYPED_TEST(RecordCursor, SelectsTheRecordItStandsOn) {
+TYPED_TEST(RecordCursor, SelectsTheCurrentRecord) {
     this->fill({"A", "B"});
     typename TypeParam::Base base;
     ++base;
@@ -141,14 +141,14 @@ TYPED_TEST(RecordCursor, SelectsForwardOnly) {
     EXPECT_EQ(this->identifier(fresh), "B");
 }
 
-TYPED_TEST(RecordCursor, SelectsByteForByte) {
+TYPED_TEST(RecordCursor, ComparesIdentifiersByteForByte) {
     this->fill({"Lease 1", "lease 10", "lease", std::string("lease 1\0x", 9), " lease 1", "lease 1", "lease 1 "});
     typename TypeParam::Base base;
     TypeParam::select(base, "lease 1");
     EXPECT_THAT(this->walked(base), ElementsAre("lease 1", "lease 1 "));
 }
 
-TYPED_TEST(RecordCursor, EndsAtTheEndWhenNoRecordHasTheIdentifier) {
+TYPED_TEST(RecordCursor, MovesToTheEndIfNoRecordHasTheIdentifier) {
     this->fill({"A", "B"});
     for (const char* identifier : {"a", "", "AB", "C"}) {
         typename TypeParam::Base base;
@@ -171,7 +171,7 @@ TYPED_TEST(RecordCursor, SelectsNoDeletedRecord) {
     EXPECT_TRUE(this->atEnd(second));
 }
 
-TYPED_TEST(RecordCursor, SelectingAtTheEndStaysThere) {
+TYPED_TEST(RecordCursor, StaysAtTheEndWhenSelecting) {
     this->fill({"A"});
     typename TypeParam::Base base;
     ++base;
@@ -179,7 +179,7 @@ TYPED_TEST(RecordCursor, SelectingAtTheEndStaysThere) {
     EXPECT_TRUE(this->atEnd(base));
 }
 
-TYPED_TEST(RecordCursor, IsNotDisturbedByRecordsThatAnotherAppends) {
+TYPED_TEST(RecordCursor, IsNotAffectedByRecordsThatAnotherCursorAppends) {
     this->fill({"A", "B"});
     typename TypeParam::Base base;
     ++base;
@@ -193,7 +193,7 @@ TYPED_TEST(RecordCursor, IsNotDisturbedByRecordsThatAnotherAppends) {
     EXPECT_EQ(this->walked(base).size(), 101U);
 }
 
-TYPED_TEST(RecordCursor, SeesChangesOfAnotherAtOnce) {
+TYPED_TEST(RecordCursor, SeesChangesOfAnotherCursorAtOnce) {
     this->fill({"A"});
     typename TypeParam::Base first;
     typename TypeParam::Base second;

@@ -1,6 +1,6 @@
-// What the lease and the warranty element have alike: filters, creation and removal.
+// Common behaviour of the lease and the warranty element: filters, creation and removal.
 
-#include "ElementSides.h"
+#include "ElementKinds.h"
 
 #include <gmock/gmock.h>
 
@@ -9,10 +9,10 @@ namespace {
 using namespace providerTest;
 using testing::ElementsAre;
 
-template <class Side>
-class RecordElement : public RecordStore<typename Side::Store> {
+template <class Kind>
+class RecordElement : public RecordStore<typename Kind::Store> {
 protected:
-    using Element = typename Side::Element;
+    using Element = typename Kind::Element;
     static constexpr typename Element::FilterType other = static_cast<typename Element::FilterType>(3);
 
     static std::string identifier(const Element& element) {
@@ -21,7 +21,7 @@ protected:
         return text;
     }
 
-    /** The identifiers from the current record on, in the order of the walk. */
+    /** Returns the identifiers from the current record on. */
     static std::vector<std::string> walked(Element& element) {
         std::vector<std::string> identifiers;
         for (; element; ++element) {
@@ -30,12 +30,12 @@ protected:
         return identifiers;
     }
 
-    static std::string identify() { return std::string("Identify a ") + Side::Store::name + " to remove."; }
+    static std::string identify() { return std::string("Identify a ") + Kind::Store::name + " to remove."; }
 };
 
-TYPED_TEST_SUITE(RecordElement, ElementSides, SideNames);
+TYPED_TEST_SUITE(RecordElement, ElementKinds, KindNames);
 
-TYPED_TEST(RecordElement, StandsOnTheFirstRecordInUse) {
+TYPED_TEST(RecordElement, StartsAtTheFirstRecordInUse) {
     this->fill({"L1", "L2"});
     this->markDeleted(0);
     typename TypeParam::Element element;
@@ -43,12 +43,12 @@ TYPED_TEST(RecordElement, StandsOnTheFirstRecordInUse) {
     EXPECT_EQ(this->identifier(element), "L2");
 }
 
-TYPED_TEST(RecordElement, StandsNowhereWithoutRecords) {
+TYPED_TEST(RecordElement, HasNoCurrentRecordWithoutRecords) {
     typename TypeParam::Element element;
     EXPECT_FALSE(stands(element));
 }
 
-TYPED_TEST(RecordElement, CannotBeMadeWhenRecordsAreCountedAndThereAreNone) {
+TYPED_TEST(RecordElement, ThrowsIfTheCountIsNotZeroAndTheTableIsEmpty) {
     this->count() = 1;
     EXPECT_EQ(thrown<InstrumentationException>([] { typename TypeParam::Element element; }),
               Words<typename TypeParam::Store>::noRecords);
@@ -62,7 +62,7 @@ TYPED_TEST(RecordElement, VisitsEveryRecordInUseWithoutAFilter) {
     EXPECT_THAT(this->walked(element), ElementsAre("L3", "L1", "L2"));
 }
 
-TYPED_TEST(RecordElement, StandsOnTheRecordOfTheFilterAndOnNoOther) {
+TYPED_TEST(RecordElement, VisitsOnlyTheRecordOfTheFilter) {
     this->fill({"L1", "L2", "L3"});
     typename TypeParam::Element element;
     element.setFilter(TypeParam::Element::InstanceIDFilter, "L2");
@@ -97,7 +97,7 @@ TYPED_TEST(RecordElement, PassesNoRecordThroughTwoDifferentFilters) {
     EXPECT_FALSE(stands(element));
 }
 
-TYPED_TEST(RecordElement, StaysOnTheRecordWhenTheSameFilterIsSetAgain) {
+TYPED_TEST(RecordElement, StaysAtTheRecordWhenTheSameFilterIsSetAgain) {
     this->fill({"L1", "L2"});
     typename TypeParam::Element element;
     element.setFilter(TypeParam::Element::InstanceIDFilter, "L2");
@@ -105,7 +105,7 @@ TYPED_TEST(RecordElement, StaysOnTheRecordWhenTheSameFilterIsSetAgain) {
     EXPECT_EQ(this->identifier(element), "L2");
 }
 
-TYPED_TEST(RecordElement, FiltersFromWhereItStandsOn) {
+TYPED_TEST(RecordElement, FiltersFromTheCurrentRecord) {
     this->fill({"L1", "L2"});
     typename TypeParam::Element element;
     ++element;
@@ -121,7 +121,7 @@ TYPED_TEST(RecordElement, PassesEveryRecordThroughAFilterOfAnotherType) {
     EXPECT_THAT(this->walked(element), ElementsAre("L1", "L2"));
 }
 
-TYPED_TEST(RecordElement, StepsOverRecordsThatDoNotPass) {
+TYPED_TEST(RecordElement, SkipsRecordsThatDoNotPass) {
     this->fill({"same", "other", "same", "other"});
     typename TypeParam::Element element;
     element.setFilter(this->other, "anything");
@@ -129,7 +129,7 @@ TYPED_TEST(RecordElement, StepsOverRecordsThatDoNotPass) {
     EXPECT_THAT(this->walked(element), ElementsAre("same", "same"));
 }
 
-TYPED_TEST(RecordElement, SkipsARecordDeletedByAnother) {
+TYPED_TEST(RecordElement, SkipsARecordDeletedByAnotherElement) {
     this->fill({"L1", "L2"});
     typename TypeParam::Element element;
     this->markDeleted(0);
@@ -166,7 +166,7 @@ TYPED_TEST(RecordElement, CreatesARecord) {
     EXPECT_EQ(this->file(), std::string("1\nL1\n") + TypeParam::Store::defaultRecord);
 }
 
-TYPED_TEST(RecordElement, RefusesToCreateARecordTwice) {
+TYPED_TEST(RecordElement, RejectsADuplicateRecord) {
     this->fill({"L1"});
     typename TypeParam::Element element;
     EXPECT_EQ(thrown<InstrumentationException>([&] { TypeParam::create(element, "L1"); }),
@@ -185,7 +185,7 @@ TYPED_TEST(RecordElement, RemovesNothingWithoutAFilter) {
     EXPECT_FALSE(std::filesystem::exists(this->path()));
 }
 
-TYPED_TEST(RecordElement, AsksForAFilterBeforeItLooksForARecord) {
+TYPED_TEST(RecordElement, ChecksForAFilterBeforeARecord) {
     typename TypeParam::Element element;
     EXPECT_EQ(thrown<InstrumentationException>([&] { TypeParam::remove(element); }), this->identify());
 }
@@ -223,7 +223,7 @@ TYPED_TEST(RecordElement, RemovesNothingWhenNoRecordPasses) {
     EXPECT_TRUE(this->table()[0].inUse);
 }
 
-TYPED_TEST(RecordElement, LetsAFailedRewriteLeaveItsEnd) {
+TYPED_TEST(RecordElement, PropagatesAFailedRewriteFromTheDestructor) {
     this->fill({"L1"});
     blockWithDirectory(this->path());
     EXPECT_EQ(thrown<InstrumentationException>([] {
@@ -235,7 +235,7 @@ TYPED_TEST(RecordElement, LetsAFailedRewriteLeaveItsEnd) {
     EXPECT_EQ(this->count(), 0U);
 }
 
-TYPED_TEST(RecordElement, LetsTheFirstExceptionGoOnWhenTheRewriteFailsToo) {
+TYPED_TEST(RecordElement, PropagatesTheFirstExceptionIfTheRewriteFails) {
     this->fill({"L1"});
     blockWithDirectory(this->path());
     EXPECT_EQ(thrown<KO::ProviderException>([] {

@@ -1,28 +1,28 @@
-// One record in the file, and back.
+// Writing and reading one record.
 
-#include "Sides.h"
+#include "RecordKinds.h"
 
 namespace {
 
 using namespace providerTest;
 
-template <class Side>
-class RecordFile : public RecordStore<Side> {
+template <class Kind>
+class RecordFile : public RecordStore<Kind> {
 protected:
-    using Unit = typename Side::Unit;
+    using Unit = typename Kind::Unit;
 
     static std::string line(const Unit& unit, std::size_t index) {
-        return linesOf(RecordStore<Side>::written(unit)).at(index);
+        return linesOf(RecordStore<Kind>::written(unit)).at(index);
     }
 };
 
-TYPED_TEST_SUITE(RecordFile, Sides, SideNames);
+TYPED_TEST_SUITE(RecordFile, RecordKinds, KindNames);
 
-TYPED_TEST(RecordFile, HoldsDefaultsForANewRecord) {
+TYPED_TEST(RecordFile, ContainsDefaultsForANewRecord) {
     EXPECT_EQ(this->written(typename TypeParam::Unit("A")), std::string("A\n") + TypeParam::defaultRecord);
 }
 
-TYPED_TEST(RecordFile, HoldsAsManyLinesForEveryRecordAsItHasFields) {
+TYPED_TEST(RecordFile, ContainsOneLinePerField) {
     typename TypeParam::Unit unit;
     EXPECT_EQ(linesOf(this->written(unit)).size(), TypeParam::linesOfRecord);
     unit.InstanceID = "with blanks ";
@@ -33,7 +33,7 @@ TYPED_TEST(RecordFile, HoldsAsManyLinesForEveryRecordAsItHasFields) {
     EXPECT_EQ(linesOf(this->written(unit)).size(), TypeParam::linesOfRecord);
 }
 
-TYPED_TEST(RecordFile, HoldsALineFeedInsideATextAsItIsWhichTakesAnotherLine) {
+TYPED_TEST(RecordFile, ContainsLineFeedsOfStringsUnescaped) {
     for (const auto& value : TypeParam::values()) {
         typename TypeParam::Unit unit("A");
         unit.*value.member = "two\nlines";
@@ -49,7 +49,7 @@ TYPED_TEST(RecordFile, HoldsALineFeedInsideATextAsItIsWhichTakesAnotherLine) {
     EXPECT_EQ(this->reread(unit).*TypeParam::textMember, "lines");
 }
 
-TYPED_TEST(RecordFile, HoldsBlanksAsUnderscoresAndGivesThemBack) {
+TYPED_TEST(RecordFile, ContainsBlanksAsUnderscoresAndReadsThemBack) {
     for (const auto& value : TypeParam::values()) {
         typename TypeParam::Unit unit("A");
         unit.*value.member = "ACME Leasing  Co";
@@ -58,7 +58,7 @@ TYPED_TEST(RecordFile, HoldsBlanksAsUnderscoresAndGivesThemBack) {
     }
 }
 
-TYPED_TEST(RecordFile, GivesUnderscoresBackAsBlanks) {
+TYPED_TEST(RecordFile, ReadsUnderscoresBackAsBlanks) {
     for (const auto& value : TypeParam::values()) {
         typename TypeParam::Unit unit("A");
         unit.*value.member = "ACME_Leasing Co";
@@ -67,7 +67,7 @@ TYPED_TEST(RecordFile, GivesUnderscoresBackAsBlanks) {
     }
 }
 
-TYPED_TEST(RecordFile, LosesValuesOfNoAndOfOneCharacter) {
+TYPED_TEST(RecordFile, LosesValuesOfAtMostOneCharacter) {
     for (const auto& value : TypeParam::values()) {
         for (const char* text : {"", "X", "*", " ", "_", "7"}) {
             typename TypeParam::Unit unit("A");
@@ -89,7 +89,7 @@ TYPED_TEST(RecordFile, KeepsValuesOfTwoCharacters) {
     }
 }
 
-TYPED_TEST(RecordFile, HoldsTheBytesOfAnyEncoding) {
+TYPED_TEST(RecordFile, ContainsTheBytesOfAnyEncoding) {
     typename TypeParam::Unit unit("M\xFCller");
     unit.*TypeParam::textMember = "M\xC3\xBCller \xFE\x80\x01";
     EXPECT_EQ(this->line(unit, 0), "M\xFCller");
@@ -98,7 +98,7 @@ TYPED_TEST(RecordFile, HoldsTheBytesOfAnyEncoding) {
     EXPECT_EQ(this->reread(unit).*TypeParam::textMember, "M\xC3\xBCller \xFE\x80\x01");
 }
 
-TYPED_TEST(RecordFile, HoldsTheDefaultDateForADateTooShort) {
+TYPED_TEST(RecordFile, ContainsTheDefaultDateForAShortDate) {
     const std::string date24 = "20240101000000.000000+00";
     for (const std::string& text : {std::string(), std::string("2024"), date24}) {
         typename TypeParam::Unit unit("A");
@@ -108,7 +108,7 @@ TYPED_TEST(RecordFile, HoldsTheDefaultDateForADateTooShort) {
     }
 }
 
-TYPED_TEST(RecordFile, KeepsADateOf25CharactersAndMoreAsItIs) {
+TYPED_TEST(RecordFile, KeepsDatesOfAtLeast25Characters) {
     for (const std::string& text : {std::string("20240101000000.000000+000"), std::string("20240101000000.000000+0000"),
                                     std::string("no_date_but_long_enough_to_be_one"), std::string(300, '9')}) {
         typename TypeParam::Unit unit("A");
@@ -125,7 +125,7 @@ TYPED_TEST(RecordFile, LeavesTheBlanksOfADateUnescaped) {
     EXPECT_EQ(this->reread(unit).*TypeParam::date().member, "20240101");
 }
 
-TYPED_TEST(RecordFile, HoldsBlanksOfAnIdentifierAsUnderscoresAndGivesThemBack) {
+TYPED_TEST(RecordFile, ContainsBlanksOfAnIdentifierAsUnderscoresAndReadsThemBack) {
     const typename TypeParam::Unit withBlank("lease 1");
     EXPECT_EQ(this->line(withBlank, 0), "lease_1");
     EXPECT_EQ(this->reread(withBlank).InstanceID, "lease 1");
@@ -142,11 +142,11 @@ TYPED_TEST(RecordFile, KeepsIdentifiersOfOneCharacter) {
     }
 }
 
-TYPED_TEST(RecordFile, HoldsAnEmptyIdentifierAsAnEmptyLine) {
+TYPED_TEST(RecordFile, ContainsAnEmptyIdentifierAsAnEmptyLine) {
     EXPECT_EQ(this->written(typename TypeParam::Unit("")), std::string("\n") + TypeParam::defaultRecord);
 }
 
-TYPED_TEST(RecordFile, ShiftsTheFieldsBehindAnEmptyIdentifierOnReading) {
+TYPED_TEST(RecordFile, ShiftsTheFieldsAfterAnEmptyIdentifierOnReading) {
     typename TypeParam::Unit unit("");
     unit.*TypeParam::textMember = "ACME Co";
     unit.*TypeParam::date().member = "20240101000000.000000+000";
@@ -157,7 +157,7 @@ TYPED_TEST(RecordFile, ShiftsTheFieldsBehindAnEmptyIdentifierOnReading) {
     EXPECT_EQ(read.*TypeParam::date().member, "36");
 }
 
-TYPED_TEST(RecordFile, HoldsNumbersAsUnsignedDecimalsWithoutPadding) {
+TYPED_TEST(RecordFile, ContainsNumbersAsUnsignedDecimalsWithoutPadding) {
     for (const auto& number : TypeParam::numbers()) {
         for (const auto& [value, text] : {std::pair(0U, "0"), std::pair(7U, "7"), std::pair(1234567U, "1234567"),
                                           std::pair(2147483648U, "2147483648"), std::pair(4294967295U, "4294967295")}) {
@@ -169,12 +169,12 @@ TYPED_TEST(RecordFile, HoldsNumbersAsUnsignedDecimalsWithoutPadding) {
     }
 }
 
-TYPED_TEST(RecordFile, ReadsEveryRecordAsOneInUse) {
+TYPED_TEST(RecordFile, ReadsEveryRecordAsInUse) {
     typename TypeParam::Unit unit("A");
     EXPECT_TRUE(this->reread(unit).inUse);
 }
 
-TYPED_TEST(RecordFile, ReadsARecordFromWhereTheStreamStands) {
+TYPED_TEST(RecordFile, ReadsARecordFromTheStreamsPosition) {
     const std::string record = std::string("A_1\n") + TypeParam::defaultRecord;
     write(this->path(), "first line\n" + record + "next");
     std::ifstream stream(this->path());
@@ -188,7 +188,7 @@ TYPED_TEST(RecordFile, ReadsARecordFromWhereTheStreamStands) {
     EXPECT_EQ(next, "next");
 }
 
-TYPED_TEST(RecordFile, KeepsFieldsThatAreNotThereAsTheyWere) {
+TYPED_TEST(RecordFile, KeepsMissingFieldsUnchanged) {
     for (const char* text : {"before_reading", "*", "_", "plain", ""}) {
         typename TypeParam::Unit before(text);
         before.*TypeParam::date().member = text;
@@ -220,7 +220,7 @@ TYPED_TEST(RecordFile, KeepsInUseOfTheRecordReadInto) {
     EXPECT_FALSE(unit.inUse);
 }
 
-TYPED_TEST(RecordFile, HandsEachWrittenLineToTheFileAtOnce) {
+TYPED_TEST(RecordFile, FlushesEachLine) {
     std::ofstream stream(this->path());
     EXPECT_EQ(&(stream << typename TypeParam::Unit("A")), &stream);
     EXPECT_EQ(this->file(), std::string("A\n") + TypeParam::defaultRecord);

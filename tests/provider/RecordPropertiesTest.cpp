@@ -1,6 +1,6 @@
 // The named properties of leases and warranties.
 
-#include "ElementSides.h"
+#include "ElementKinds.h"
 
 namespace {
 
@@ -8,7 +8,7 @@ using namespace providerTest;
 using KO::LeaseWarrantyProvider::Lease;
 using KO::LeaseWarrantyProvider::Warranty;
 
-/** One property: its operations and the member that they reach. */
+/** A property: its accessors and its member. */
 template <class Element, class Unit, class Value>
 struct PropertyRow {
     const char* name;
@@ -54,13 +54,16 @@ const WarrantyRow<unsigned int> warrantyNumbers[] = {
     {"Duration", &Warranty::getDuration, &Warranty::setDuration, &WarrantyUnit::Duration},
 };
 
-template <class Side>
-class RecordProperties : public RecordStore<typename Side::Store> {
+template <class Kind>
+class RecordProperties : public RecordStore<typename Kind::Store> {
 protected:
-    using Element = typename Side::Element;
-    using Unit = typename Side::Store::Unit;
+    using Element = typename Kind::Element;
+    using Unit = typename Kind::Store::Unit;
 
-    /** The property is set, alone, in the current record, and comes back; at the end both refuse. */
+    /**
+     * Expects that the property is set in the current record only and is read back, and that both accessors throw at
+     * the end.
+     */
     template <class Value>
     void expectProperty(const PropertyRow<Element, Unit, Value>& row, const Value& stored) {
         SCOPED_TRACE(row.name);
@@ -71,23 +74,23 @@ protected:
         Element element;
         element.setFilter(Element::InstanceIDFilter, "current");
         (element.*row.set)(stored);
-        EXPECT_EQ(Side::Store::members(this->table()[1]), Side::Store::members(expected));
+        EXPECT_EQ(Kind::Store::members(this->table()[1]), Kind::Store::members(expected));
         const Unit untouched("before");
-        EXPECT_EQ(Side::Store::members(this->table()[0]), Side::Store::members(untouched));
+        EXPECT_EQ(Kind::Store::members(this->table()[0]), Kind::Store::members(untouched));
         Value value{};
         EXPECT_TRUE((element.*row.get)(value));
         EXPECT_EQ(value, stored);
         ++element;
-        const auto notAvailable = Words<typename Side::Store>::notAvailable;
+        const auto notAvailable = Words<typename Kind::Store>::notAvailable;
         EXPECT_EQ(thrown<InstrumentationException>([&] { (element.*row.get)(value); }), notAvailable);
         EXPECT_EQ(thrown<InstrumentationException>([&] { (element.*row.set)(stored); }), notAvailable);
     }
 };
 
-using LeaseProperties = RecordProperties<LeaseElementSide>;
-using WarrantyProperties = RecordProperties<WarrantyElementSide>;
+using LeaseProperties = RecordProperties<LeaseElementKind>;
+using WarrantyProperties = RecordProperties<WarrantyElementKind>;
 
-TEST_F(LeaseProperties, AreReachedByTheirOwnOperations) {
+TEST_F(LeaseProperties, HaveTheirOwnAccessors) {
     for (const auto& row : leaseTexts) {
         expectProperty(row, std::string("some text"));
     }
@@ -99,7 +102,7 @@ TEST_F(LeaseProperties, AreReachedByTheirOwnOperations) {
     }
 }
 
-TEST_F(WarrantyProperties, AreReachedByTheirOwnOperations) {
+TEST_F(WarrantyProperties, HaveTheirOwnAccessors) {
     for (const auto& row : warrantyTexts) {
         expectProperty(row, std::string("some text"));
     }
@@ -108,7 +111,7 @@ TEST_F(WarrantyProperties, AreReachedByTheirOwnOperations) {
     }
 }
 
-TEST_F(LeaseProperties, ComeBackFromTheFile) {
+TEST_F(LeaseProperties, AreReadBackFromTheFile) {
     fill({"lease 1"});
     {
         Lease lease;
@@ -124,16 +127,16 @@ TEST_F(LeaseProperties, ComeBackFromTheFile) {
     }
     const LeaseCache reloaded;
     const LeaseUnit& unit = reloaded.table.at(0);
-    EXPECT_EQ(LeaseSide::members(unit), LeaseSide::members(table().at(0)));
+    EXPECT_EQ(LeaseKind::members(unit), LeaseKind::members(table().at(0)));
     for (const auto& row : leaseTexts) {
         EXPECT_EQ(unit.*row.member, std::string("long-enough-for-a-date-of-") + row.name);
     }
 }
 
-template <class Side>
-class CommonProperties : public RecordProperties<Side> {};
+template <class Kind>
+class CommonProperties : public RecordProperties<Kind> {};
 
-TYPED_TEST_SUITE(CommonProperties, ElementSides, SideNames);
+TYPED_TEST_SUITE(CommonProperties, ElementKinds, KindNames);
 
 TYPED_TEST(CommonProperties, HaveAnElementName) {
     const typename TypeParam::Element element;
@@ -142,7 +145,7 @@ TYPED_TEST(CommonProperties, HaveAnElementName) {
     EXPECT_EQ(text, std::string(TypeParam::Store::name) + " Information");
 }
 
-TYPED_TEST(CommonProperties, HaveNoneOfTheOthersAndLeaveTheirOutputAlone) {
+TYPED_TEST(CommonProperties, HaveNoOtherValuesAndKeepTheArguments) {
     this->fill({"A"});
     const typename TypeParam::Element element;
     std::string text = "before";

@@ -23,7 +23,7 @@ inline cimhost::NamedValue textKey(const std::string& name, const std::string& t
     return {name, {CMPI_string, false, false, {text}}};
 }
 
-/** Requests as an object manager makes them, of a provider whose tables a test can reach. Both start empty. */
+/** Makes requests like an object manager. Tests can access the provider's tables, which are empty at first. */
 class RequestTest : public CleanAgent {
 protected:
     void SetUp() override {
@@ -47,7 +47,7 @@ protected:
     }
 
     /** @name Requests
-     * Each answers the status code; what they return is added to the events.
+     * Each returns the status code and appends the results to the events.
      */
     ///@{
     CMPIrc enumerate(const std::string& className) {

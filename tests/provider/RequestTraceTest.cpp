@@ -16,7 +16,7 @@ const std::string rule(78, '=');
 
 using RequestTrace = RequestTest;
 
-TEST_F(RequestTrace, StandsBetweenTwoRules) {
+TEST_F(RequestTrace, IsEnclosedBySeparators) {
     enumerate("VELKO_Lease");
     const auto lines = texts();
     ASSERT_GT(lines.size(), 6U);
@@ -30,7 +30,7 @@ TEST_F(RequestTrace, StandsBetweenTwoRules) {
     EXPECT_EQ(lines.back(), rule);
 }
 
-TEST_F(RequestTrace, GoesLineByLineToTheLogChannelAndThenToTheTraceChannel) {
+TEST_F(RequestTrace, IsWrittenLineByLineToTheLogAndTheTraceChannel) {
     LeaseBase::cache.table.push_back(LeaseUnit("L1"));
     LeaseBase::cache.recordCountLease = 1;
     agentEnvironment::forgetLog();
@@ -50,7 +50,7 @@ TEST_F(RequestTrace, GoesLineByLineToTheLogChannelAndThenToTheTraceChannel) {
     }
 }
 
-TEST_F(RequestTrace, FilesEachUnitUnderItsLogger) {
+TEST_F(RequestTrace, UsesTheLoggerOfEachSourceFile) {
     LeaseBase::cache.table.push_back(LeaseUnit("L1"));
     LeaseBase::cache.recordCountLease = 1;
     WarrantyBase::cache.table.push_back(WarrantyUnit("W1"));
@@ -78,7 +78,7 @@ TEST_F(RequestTrace, FilesEachUnitUnderItsLogger) {
     EXPECT_EQ(loggersOfUnits, expected);
 }
 
-TEST_F(RequestTrace, TellsAtErrorLevelWhatWasThrownAndStillMarksTheExit) {
+TEST_F(RequestTrace, LogsExceptionsAtErrorLevelAndTheExit) {
     get("VELKO_OstrelAgent", {textKey("Version", "another")});
     const auto failures = recordsOf(entryFile, "LeaseAndWarranty_GetInstance");
     ASSERT_FALSE(failures.empty());
@@ -89,7 +89,7 @@ TEST_F(RequestTrace, TellsAtErrorLevelWhatWasThrownAndStillMarksTheExit) {
     EXPECT_EQ(lines.back(), rule);
 }
 
-TEST_F(RequestTrace, OfAnUnknownClassHoldsNoWork) {
+TEST_F(RequestTrace, OfAnUnknownClassContainsNoFurtherLines) {
     enumerate("VELKO_Unheard");
     EXPECT_THAT(texts(), ElementsAre(rule, entering("LeaseAndWarranty_EnumInstances", entryFile),
                                      variable("classId", "0", entryFile),

@@ -1,6 +1,6 @@
-// When the record file is rewritten, and what happens when it cannot be.
+// Rewriting the record file, and failures to rewrite it.
 
-#include "Sides.h"
+#include "RecordKinds.h"
 
 #include <gmock/gmock.h>
 
@@ -11,33 +11,33 @@ namespace {
 
 using namespace providerTest;
 
-template <class Side>
-class Rewrite : public RecordStore<Side> {
+template <class Kind>
+class Rewrite : public RecordStore<Kind> {
 protected:
-    using Base = typename Side::Base;
+    using Base = typename Kind::Base;
 
-    static void change(Base& base, const std::string& text) { base.setProperty(Side::text, text); }
+    static void change(Base& base, const std::string& text) { base.setProperty(Kind::text, text); }
 
-    /** One record "A" with its text. */
+    /** Returns a file with one record "A" that contains the string. */
     static std::string fileWith(const std::string& text) {
-        std::string record = Side::defaultRecord;
+        std::string record = Kind::defaultRecord;
         record.replace(record.find('*'), 1, text);
         return "1\nA\n" + record;
     }
 
-    /** That the cursor's end told, at error level, that the file could not be rewritten. */
+    /** Expects that the destructor logged the failure to rewrite the file at error level. */
     static void expectRewriteFailureTold() {
-        const auto records = recordsOf(Words<Side>::sourceFile, std::string("~") + Side::name + "Base");
+        const auto records = recordsOf(Words<Kind>::sourceFile, std::string("~") + Kind::name + "Base");
         const auto failure =
             std::find_if(records.begin(), records.end(), [](const LogRecord& record) { return record.level == 3000; });
         ASSERT_NE(failure, records.end());
-        EXPECT_EQ(withoutLine(failure->text), message(Words<Side>::cannotOpen, Words<Side>::sourceFile));
+        EXPECT_EQ(withoutLine(failure->text), message(Words<Kind>::cannotOpen, Words<Kind>::sourceFile));
     }
 };
 
-TYPED_TEST_SUITE(Rewrite, Sides, SideNames);
+TYPED_TEST_SUITE(Rewrite, RecordKinds, KindNames);
 
-TYPED_TEST(Rewrite, FollowsAChangeWhenTheCursorEnds) {
+TYPED_TEST(Rewrite, HappensWhenACursorWithChangesIsDestroyed) {
     this->fill({"A"});
     {
         typename TypeParam::Base base;
@@ -47,7 +47,7 @@ TYPED_TEST(Rewrite, FollowsAChangeWhenTheCursorEnds) {
     EXPECT_EQ(this->file(), this->fileWith("ACME"));
 }
 
-TYPED_TEST(Rewrite, NeverFollowsReading) {
+TYPED_TEST(Rewrite, DoesNotHappenAfterReading) {
     this->fill({"A"});
     write(this->path(), "edited by somebody else");
     {
@@ -61,7 +61,7 @@ TYPED_TEST(Rewrite, NeverFollowsReading) {
     EXPECT_EQ(this->file(), "edited by somebody else");
 }
 
-TYPED_TEST(Rewrite, NeverFollowsARefusedChange) {
+TYPED_TEST(Rewrite, DoesNotHappenAfterARejectedChange) {
     this->fill({"A"});
     {
         typename TypeParam::Base base;
@@ -91,7 +91,7 @@ TYPED_TEST(Rewrite, HappensOnceForManyChanges) {
                                      exiting("flushCache", Words<TypeParam>::sourceFile)));
 }
 
-TYPED_TEST(Rewrite, FollowsAChangeToTheSameValueToo) {
+TYPED_TEST(Rewrite, HappensAfterAChangeToTheSameValue) {
     this->fill({"A"});
     {
         typename TypeParam::Base base;
@@ -100,7 +100,7 @@ TYPED_TEST(Rewrite, FollowsAChangeToTheSameValueToo) {
     EXPECT_EQ(this->file(), std::string("1\nA\n") + TypeParam::defaultRecord);
 }
 
-TYPED_TEST(Rewrite, FollowsDeletionOfTheOnlyRecord) {
+TYPED_TEST(Rewrite, HappensAfterDeletionOfTheOnlyRecord) {
     this->fill({"A"});
     {
         typename TypeParam::Base base;
@@ -109,7 +109,7 @@ TYPED_TEST(Rewrite, FollowsDeletionOfTheOnlyRecord) {
     EXPECT_EQ(this->file(), "0\n");
 }
 
-TYPED_TEST(Rewrite, ReplacesWhateverTheFileHeld) {
+TYPED_TEST(Rewrite, ReplacesTheContentOfTheFile) {
     this->fill({"A"});
     write(this->path(), std::string(5000, 'x'));
     {
@@ -119,7 +119,7 @@ TYPED_TEST(Rewrite, ReplacesWhateverTheFileHeld) {
     EXPECT_EQ(this->file(), this->fileWith("ACME"));
 }
 
-TYPED_TEST(Rewrite, CarriesChangesOfCursorsThatHaveNotEnded) {
+TYPED_TEST(Rewrite, IncludesChangesOfOtherCursors) {
     this->fill({"A"});
     typename TypeParam::Base longLived;
     this->change(longLived, "ACME");
@@ -130,7 +130,7 @@ TYPED_TEST(Rewrite, CarriesChangesOfCursorsThatHaveNotEnded) {
     EXPECT_EQ(this->file(), this->fileWith("ACME"));
 }
 
-TYPED_TEST(Rewrite, GivesWhatTheNextLoadingFinds) {
+TYPED_TEST(Rewrite, IsReadByTheNextLoad) {
     {
         typename TypeParam::Base base;
         TypeParam::create(base, "lease 1");
@@ -147,7 +147,7 @@ TYPED_TEST(Rewrite, GivesWhatTheNextLoadingFinds) {
     EXPECT_EQ(reloaded.table[1].InstanceID, "lease 2");
 }
 
-TYPED_TEST(Rewrite, ThatFailsLeavesTheCursorsEndAsAnException) {
+TYPED_TEST(Rewrite, ThatFailsThrowsFromTheDestructor) {
     this->fill({"A"});
     blockWithDirectory(this->path());
     EXPECT_EQ(thrown<InstrumentationException>([&] {
@@ -178,7 +178,7 @@ TYPED_TEST(Rewrite, ThatFailsKeepsTheChangeInTheTable) {
     EXPECT_EQ(this->file(), this->fileWith("ACME"));
 }
 
-TYPED_TEST(Rewrite, ThatFailsIsTriedOnceAndToldAtErrorLevel) {
+TYPED_TEST(Rewrite, ThatFailsIsTriedOnceAndLoggedAtErrorLevel) {
     this->fill({"A"});
     blockWithDirectory(this->path());
     agentEnvironment::forgetLog();
@@ -204,7 +204,7 @@ TYPED_TEST(Rewrite, WithoutADataDirectoryFails) {
               Words<TypeParam>::cannotOpen);
 }
 
-TYPED_TEST(Rewrite, ThatFailsWhileAnExceptionIsLeavingIsOnlyTold) {
+TYPED_TEST(Rewrite, ThatFailsDuringUnwindingIsOnlyLogged) {
     this->fill({"A"});
     blockWithDirectory(this->path());
     agentEnvironment::forgetLog();
@@ -218,7 +218,7 @@ TYPED_TEST(Rewrite, ThatFailsWhileAnExceptionIsLeavingIsOnlyTold) {
     EXPECT_EQ(this->table().at(0).*TypeParam::textMember, "ACME");
 }
 
-/** Does something while an exception of somebody else's is leaving, as an object manager may call a provider. */
+/** Runs an action during the unwinding of an unrelated exception, as an object manager may. */
 template <class Action>
 void whileUnwinding(Action action) {
     struct AtEnd {
@@ -233,7 +233,7 @@ void whileUnwinding(Action action) {
     }
 }
 
-TYPED_TEST(Rewrite, ThatFailsForACursorMadeDuringUnwindingLeavesAsAnException) {
+TYPED_TEST(Rewrite, ThatFailsForACursorCreatedDuringUnwindingThrows) {
     this->fill({"A"});
     blockWithDirectory(this->path());
     std::string failure;
@@ -247,7 +247,7 @@ TYPED_TEST(Rewrite, ThatFailsForACursorMadeDuringUnwindingLeavesAsAnException) {
     EXPECT_EQ(this->table().at(0).*TypeParam::textMember, "ACME");
 }
 
-TYPED_TEST(Rewrite, ThatFailsBehindAnExceptionDuringUnwindingIsOnlyTold) {
+TYPED_TEST(Rewrite, ThatFailsDuringNestedUnwindingIsOnlyLogged) {
     this->fill({"A"});
     blockWithDirectory(this->path());
     agentEnvironment::forgetLog();
@@ -263,7 +263,7 @@ TYPED_TEST(Rewrite, ThatFailsBehindAnExceptionDuringUnwindingIsOnlyTold) {
     this->expectRewriteFailureTold();
 }
 
-TYPED_TEST(Rewrite, HappensWhileAnExceptionIsLeaving) {
+TYPED_TEST(Rewrite, HappensDuringUnwinding) {
     this->fill({"A"});
     EXPECT_EQ(thrown<std::runtime_error>([&] {
                   typename TypeParam::Base base;
@@ -274,14 +274,14 @@ TYPED_TEST(Rewrite, HappensWhileAnExceptionIsLeaving) {
     EXPECT_EQ(this->file(), this->fileWith("ACME"));
 }
 
-TYPED_TEST(Rewrite, ByTheTableItselfFailsWithTheSameException) {
+TYPED_TEST(Rewrite, ByTheTableThrowsTheSameException) {
     blockWithDirectory(this->path());
     EXPECT_EQ(thrown<InstrumentationException>([] { TypeParam::cache().flushCache(); }), Words<TypeParam>::cannotOpen);
 }
 
-using BothStores = RecordStore<LeaseSide>;
+using BothStores = RecordStore<LeaseKind>;
 
-TEST_F(BothStores, ShareNothing) {
+TEST_F(BothStores, ShareNoData) {
     {
         LeaseBase lease;
         lease.createLease("same");
@@ -290,9 +290,9 @@ TEST_F(BothStores, ShareNothing) {
         warranty.createWarranty("same");
     }
     EXPECT_EQ(contentOf(agentEnvironment::dataDirectory() / "Lease.dat"),
-              std::string("1\nsame\n") + LeaseSide::defaultRecord);
+              std::string("1\nsame\n") + LeaseKind::defaultRecord);
     EXPECT_EQ(contentOf(agentEnvironment::dataDirectory() / "Warranty.dat"),
-              std::string("1\nsame\n") + WarrantySide::defaultRecord);
+              std::string("1\nsame\n") + WarrantyKind::defaultRecord);
     WarrantyBase::cache.table.clear();
     WarrantyBase::cache.recordCountWarranty = 0;
 }

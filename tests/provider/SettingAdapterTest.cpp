@@ -1,4 +1,4 @@
-// The operations of the setting adapters that translate between the paths of both ends.
+// Translation between the paths of both ends in the setting adapters.
 
 #include "CMPILeaseSetting.h"
 #include "CMPIWarrantySetting.h"
@@ -36,10 +36,10 @@ struct WarrantySettingAdapter {
     static constexpr CMPIObjectPath* (Adapter::*locate)(const CMPIObjectPath*) = &Adapter::locateWarranty;
 };
 
-template <class Side>
+template <class Kind>
 class SettingAdapter : public CleanAgent {
 protected:
-    using Adapter = typename Side::Adapter;
+    using Adapter = typename Kind::Adapter;
     static constexpr CMPIObjectPath* (Adapter::*locateComputer)(const CMPIObjectPath*) = &Adapter::locateComputer;
     static constexpr const char* computerClass = "VELKO_ComputerSystem";
 
@@ -53,7 +53,7 @@ protected:
         return made;
     }
 
-    /** What an adapter translates a path to. */
+    /** Returns an adapter's translation of a path. */
     const CMPIObjectPath* located(CMPIObjectPath* (Adapter::*operation)(const CMPIObjectPath*),
                                   const CMPIObjectPath* source) {
         Adapter adapter(broker.handle(), nullptr, path(computerClass));
@@ -70,13 +70,13 @@ protected:
         EXPECT_EQ(foundValue, value);
     }
 
-    /** The operation is traced under its own name at error level, with the path it received. */
+    /** Expects that the operation is traced at error level under its name, with the path as its argument. */
     static void expectTraced(const char* function, const CMPIObjectPath* source) {
         std::ostringstream list;
         list << " objectPath=" << source;
-        EXPECT_THAT(textsOf(Side::sourceFile, function), ElementsAre(entering(function, Side::sourceFile, list.str()),
-                                                                     exiting(function, Side::sourceFile, list.str())));
-        for (const LogRecord& record : recordsOf(Side::sourceFile, function)) {
+        EXPECT_THAT(textsOf(Kind::sourceFile, function), ElementsAre(entering(function, Kind::sourceFile, list.str()),
+                                                                     exiting(function, Kind::sourceFile, list.str())));
+        for (const LogRecord& record : recordsOf(Kind::sourceFile, function)) {
             EXPECT_EQ(record.level, 3000);
         }
     }
@@ -88,15 +88,15 @@ protected:
 using SettingAdapters = testing::Types<LeaseSettingAdapter, WarrantySettingAdapter>;
 
 struct AdapterNames {
-    template <class Side>
+    template <class Kind>
     static std::string GetName(int) {
-        return Side::elementClass;
+        return Kind::elementClass;
     }
 };
 
 TYPED_TEST_SUITE(SettingAdapter, SettingAdapters, AdapterNames);
 
-TYPED_TEST(SettingAdapter, LocatesTheElementOfAComputerUnderTheNameOfItsClass) {
+TYPED_TEST(SettingAdapter, LocatesTheElementOfAComputer) {
     const CMPIObjectPath* source = this->path(this->computerClass, "Name", "alpha");
     this->expectPath(this->located(TypeParam::locate, source), TypeParam::elementClass, "InstanceID",
                      "/system/first%20box");
@@ -109,7 +109,7 @@ TYPED_TEST(SettingAdapter, LocatesTheComputerOfAnElement) {
     this->expectTraced("locateComputer", source);
 }
 
-TYPED_TEST(SettingAdapter, LocatesThePathWithoutKeysForASourceWithoutKeys) {
+TYPED_TEST(SettingAdapter, ReturnsAPathWithoutKeysForASourceWithoutKeys) {
     EXPECT_EQ(ProviderUtilities::getKeyCount(this->located(TypeParam::locate, this->path(this->computerClass))), 0U);
     EXPECT_EQ(ProviderUtilities::getKeyCount(this->located(this->locateComputer, this->path(TypeParam::elementClass))),
               0U);

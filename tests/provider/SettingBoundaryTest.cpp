@@ -1,7 +1,7 @@
-// What the framework throws in a moniker operation, and what of it may leave; and keys that cannot be selected. The
-// program's own operations of Moniker that read keys take the place of the framework's.
+// Exceptions of the framework in a moniker operation, and keys that cannot be selected. The program replaces the
+// operations of Moniker that read keys.
 
-#include "SettingSides.h"
+#include "SettingKinds.h"
 
 #include <csignal>
 #include <functional>
@@ -15,7 +15,7 @@ namespace {
 
 using Key = std::pair<std::string, std::string>;
 
-/** What every moniker of the program is read as. */
+/** The keys of every moniker in the program. */
 struct MonikerDouble {
     std::function<void()> beforeCounting = [] {};
     std::vector<Key> keys{};
@@ -28,7 +28,7 @@ MonikerDouble& monikers() {
     return theDouble;
 }
 
-/** Gives the selected key's name or value; without a selection there is none. */
+/** Reads the selected key's name or value; returns false without a selection. */
 bool readSelected(std::string Key::*part, std::string& text) {
     if (!monikers().selected) {
         return false;
@@ -67,12 +67,12 @@ using namespace providerTest;
 constexpr const char* noNameKey = "Could not find 'Name' Key in Moniker";
 constexpr const char* noInstanceIdKey = "Could not find 'InstanceID' Key in Moniker";
 
-template <class Side>
-class MonikerBoundary : public RecordStore<typename Side::Store> {
+template <class Kind>
+class MonikerBoundary : public RecordStore<typename Kind::Store> {
 protected:
     void TearDown() override {
         monikers() = {};
-        RecordStore<typename Side::Store>::TearDown();
+        RecordStore<typename Kind::Store>::TearDown();
     }
 
     template <class Thrown>
@@ -80,65 +80,65 @@ protected:
         monikers().beforeCounting = [failure] { throw failure; };
     }
 
-    void toElement() { Side::elementMoniker(setting, argument); }
+    void toElement() { Kind::elementMoniker(setting, argument); }
     void toComputer() { setting.getComputerMoniker(argument); }
 
-    /** Both operations end the process, by its abnormal end. */
+    /** Expects both operations to terminate the process. */
     void expectEnd() {
         EXPECT_EXIT(toElement(), testing::KilledBySignal(SIGABRT), "terminate");
         EXPECT_EXIT(toComputer(), testing::KilledBySignal(SIGABRT), "terminate");
     }
 
-    std::unique_ptr<typename Side::Setting> owner = std::make_unique<typename Side::Setting>();
-    typename Side::Setting& setting = *owner;
+    std::unique_ptr<typename Kind::Setting> owner = std::make_unique<typename Kind::Setting>();
+    typename Kind::Setting& setting = *owner;
     Moniker argument{};
 };
 
-template <class Side>
-using MonikerBoundaryDeathTest = MonikerBoundary<Side>;
+template <class Kind>
+using MonikerBoundaryDeathTest = MonikerBoundary<Kind>;
 
-TYPED_TEST_SUITE(MonikerBoundary, SettingSides, SideNames);
-TYPED_TEST_SUITE(MonikerBoundaryDeathTest, SettingSides, SideNames);
+TYPED_TEST_SUITE(MonikerBoundary, SettingKinds, KindNames);
+TYPED_TEST_SUITE(MonikerBoundaryDeathTest, SettingKinds, KindNames);
 
-TYPED_TEST(MonikerBoundary, LetsTheElementsOwnFailuresOut) {
+TYPED_TEST(MonikerBoundary, PropagatesFailuresOfTheElement) {
     EXPECT_EQ(thrown<FrameworkException>([&] { this->toElement(); }), noNameKey);
     EXPECT_EQ(thrown<FrameworkException>([&] { this->toComputer(); }), noInstanceIdKey);
 }
 
-TYPED_TEST(MonikerBoundary, LetsInstrumentationExceptionsOut) {
+TYPED_TEST(MonikerBoundary, PropagatesInstrumentationExceptions) {
     this->frameworkThrows(InstrumentationException("from below"));
     EXPECT_EQ(thrown<InstrumentationException>([&] { this->toElement(); }), "from below");
     EXPECT_EQ(thrown<InstrumentationException>([&] { this->toComputer(); }), "from below");
 }
 
-TYPED_TEST(MonikerBoundary, LetsFrameworkExceptionsOut) {
+TYPED_TEST(MonikerBoundary, PropagatesFrameworkExceptions) {
     this->frameworkThrows(FrameworkException("from below"));
     EXPECT_EQ(thrown<FrameworkException>([&] { this->toElement(); }), "from below");
     EXPECT_EQ(thrown<FrameworkException>([&] { this->toComputer(); }), "from below");
 }
 
-TYPED_TEST(MonikerBoundary, TellsLackOfMemoryAsAFrameworkException) {
+TYPED_TEST(MonikerBoundary, ReportsLackOfMemoryAsAFrameworkException) {
     this->frameworkThrows(std::bad_alloc());
     EXPECT_EQ(thrown<FrameworkException>([&] { this->toElement(); }), "out of memory");
     EXPECT_EQ(thrown<FrameworkException>([&] { this->toComputer(); }), "out of memory");
 }
 
-TYPED_TEST(MonikerBoundaryDeathTest, EndsTheProcessOnAProviderException) {
+TYPED_TEST(MonikerBoundaryDeathTest, TerminatesOnAProviderException) {
     this->frameworkThrows(KO::ProviderException("from below"));
     this->expectEnd();
 }
 
-TYPED_TEST(MonikerBoundaryDeathTest, EndsTheProcessOnAStandardException) {
+TYPED_TEST(MonikerBoundaryDeathTest, TerminatesOnAStandardException) {
     this->frameworkThrows(std::runtime_error("from below"));
     this->expectEnd();
 }
 
-TYPED_TEST(MonikerBoundaryDeathTest, EndsTheProcessOnWhatIsNoExceptionObject) {
+TYPED_TEST(MonikerBoundaryDeathTest, TerminatesOnANonstandardException) {
     this->frameworkThrows(5);
     this->expectEnd();
 }
 
-TYPED_TEST(MonikerBoundary, PassesOverAKeyThatCannotBeSelected) {
+TYPED_TEST(MonikerBoundary, SkipsAKeyThatCannotBeSelected) {
     monikers().keys = {{"Name", "nobody"}, {"Name", "testhost"}, {"InstanceID", "/nowhere"}, {"InstanceID", "/system"}};
     monikers().selected = 0;
     monikers().unselectable = {0, 2};
@@ -152,7 +152,7 @@ TYPED_TEST(MonikerBoundary, PassesOverAKeyThatCannotBeSelected) {
         << "the name of the system";
 }
 
-TYPED_TEST(MonikerBoundary, DoesNotTakeTheKeySelectedBeforeForOneThatCannotBeSelected) {
+TYPED_TEST(MonikerBoundary, DoesNotReuseThePrecedingKeyIfSelectionFails) {
     monikers().keys = {{"Name", "testhost"}, {"InstanceID", "/system"}};
     monikers().unselectable = {0, 1};
     monikers().selected = 0;

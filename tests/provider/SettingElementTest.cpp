@@ -1,17 +1,17 @@
-// From a computer to its lease or warranty, and back.
+// Translation between a computer and its lease or warranty.
 
-#include "SettingSides.h"
+#include "SettingKinds.h"
 
 namespace {
 
 using namespace providerTest;
 
-TYPED_TEST_SUITE(SettingElement, SettingSides, SideNames);
+TYPED_TEST_SUITE(SettingElement, SettingKinds, KindNames);
 
 constexpr const char* noNameKey = "Could not find 'Name' Key in Moniker";
 constexpr const char* noInstanceIdKey = "Could not find 'InstanceID' Key in Moniker";
 
-TYPED_TEST(SettingElement, GivesTheTextOfTheComputersPath) {
+TYPED_TEST(SettingElement, ReturnsTheStringFormOfTheComputersPath) {
     EXPECT_EQ(this->toElement({{"Name", "alpha"}}), (Keys{{"InstanceID", "/system/first%20box"}}));
 }
 
@@ -19,54 +19,54 @@ TYPED_TEST(SettingElement, FindsTheSecondComputer) {
     EXPECT_EQ(this->toElement({{"Name", "beta"}}), (Keys{{"InstanceID", "/system/second%5Fbox"}}));
 }
 
-TYPED_TEST(SettingElement, NamesTheComputerOfAPath) {
+TYPED_TEST(SettingElement, ReturnsTheNameOfThePathsComputer) {
     EXPECT_EQ(this->toComputer({{"InstanceID", "/system/first%20box"}}), (Keys{{"Name", "alpha"}}));
     EXPECT_EQ(this->toComputer({{"InstanceID", "/system/second%5Fbox"}}), (Keys{{"Name", "beta"}}));
     EXPECT_EQ(this->toComputer({{"InstanceID", "/system/third"}}), (Keys{{"Name", "beta"}}));
 }
 
-TYPED_TEST(SettingElement, NamesWhateverNodeThePathLeadsTo) {
+TYPED_TEST(SettingElement, ReturnsTheNameOfAnyNode) {
     EXPECT_EQ(this->toComputer({{"InstanceID", "/system"}}), (Keys{{"Name", "the system"}}));
 }
 
-TYPED_TEST(SettingElement, NamesTheComputerItStartedFromAgain) {
+TYPED_TEST(SettingElement, ReturnsTheOriginalComputerFromBothTranslations) {
     for (const char* name : {"alpha", "beta"}) {
         EXPECT_EQ(this->toComputer(this->toElement({{"Name", name}})), (Keys{{"Name", name}}));
     }
 }
 
-TYPED_TEST(SettingElement, GivesTheTextOfNoNodeForAnUnknownComputer) {
+TYPED_TEST(SettingElement, ReturnsTheEmptyPathForAnUnknownComputer) {
     for (const char* name : {"ALPHA", "alpha ", "", "the system"}) {
         EXPECT_EQ(this->toElement({{"Name", name}}), (Keys{{"InstanceID", ""}})) << name;
     }
 }
 
-TYPED_TEST(SettingElement, FindsAKeyBehindOthers) {
+TYPED_TEST(SettingElement, FindsAKeyAfterOthers) {
     EXPECT_EQ(this->toElement({{"CreationClassName", "alpha"}, {"Name", "beta"}}),
               (Keys{{"InstanceID", "/system/second%5Fbox"}}));
     EXPECT_EQ(this->toComputer({{"Name", "x"}, {"ElementName", "y"}, {"InstanceID", "/system/third"}}),
               (Keys{{"Name", "beta"}}));
 }
 
-TYPED_TEST(SettingElement, TakesTheFirstOfTwoKeysOfOneName) {
+TYPED_TEST(SettingElement, UsesTheFirstOfTwoKeysWithTheSameName) {
     EXPECT_EQ(this->toElement({{"Name", "alpha"}, {"Name", "beta"}}), (Keys{{"InstanceID", "/system/first%20box"}}));
     EXPECT_EQ(this->toComputer({{"InstanceID", "/system/third"}, {"InstanceID", "/system"}}), (Keys{{"Name", "beta"}}));
 }
 
-TYPED_TEST(SettingElement, RefusesAComputerWithoutItsKey) {
+TYPED_TEST(SettingElement, RejectsAComputerWithoutItsKey) {
     for (const Keys& keys : {Keys{}, Keys{{"name", "alpha"}}, Keys{{"NAME", "alpha"}}, Keys{{"Name ", "alpha"}},
                              Keys{{"InstanceID", "alpha"}, {"", "alpha"}}}) {
         EXPECT_EQ(thrown<FrameworkException>([&] { this->toElement(keys); }), noNameKey);
     }
 }
 
-TYPED_TEST(SettingElement, RefusesALeaseOrWarrantyWithoutItsKey) {
+TYPED_TEST(SettingElement, RejectsALeaseOrWarrantyWithoutItsKey) {
     for (const Keys& keys : {Keys{}, Keys{{"InstanceId", "/system/third"}}, Keys{{"Name", "/system/third"}}}) {
         EXPECT_EQ(thrown<FrameworkException>([&] { this->toComputer(keys); }), noInstanceIdKey);
     }
 }
 
-TYPED_TEST(SettingElement, RefusesAPathToNoNodeOrToOneWithoutName) {
+TYPED_TEST(SettingElement, RejectsAPathWithoutANodeOrToAnUnnamedNode) {
     for (const char* path : {"", "/system/fourth", "/SYSTEM", "/system/first box ", "/system/fan", "lease 1"}) {
         EXPECT_EQ(thrown<InstrumentationException>([&] {
                       this->toComputer({{"InstanceID", path}});
@@ -76,7 +76,7 @@ TYPED_TEST(SettingElement, RefusesAPathToNoNodeOrToOneWithoutName) {
     }
 }
 
-TYPED_TEST(SettingElement, SelectsAfreshInEachCall) {
+TYPED_TEST(SettingElement, SelectsAgainInEachCall) {
     EXPECT_EQ(this->toElement({{"Name", "beta"}}), (Keys{{"InstanceID", "/system/second%5Fbox"}}));
     EXPECT_EQ(this->toElement({{"Name", "alpha"}}), (Keys{{"InstanceID", "/system/first%20box"}}));
     EXPECT_EQ(this->toComputer({{"InstanceID", "/system"}}), (Keys{{"Name", "the system"}}));
@@ -85,7 +85,7 @@ TYPED_TEST(SettingElement, SelectsAfreshInEachCall) {
     EXPECT_EQ(this->toComputer({{"InstanceID", "/system/third"}}), (Keys{{"Name", "beta"}}));
 }
 
-TYPED_TEST(SettingElement, SelectsAfreshInEachCallWhateverRecordItsElementStandsOn) {
+TYPED_TEST(SettingElement, SelectsAgainRegardlessOfTheCurrentRecord) {
     this->fill({"/system/first%20box", "unrelated", "/system/second%5Fbox"});
     typename TypeParam::Setting fresh;
     const auto toElement = [&](const char* name) {
@@ -107,7 +107,7 @@ TYPED_TEST(SettingElement, SelectsAfreshInEachCallWhateverRecordItsElementStands
     EXPECT_EQ(toComputer("/system/first%20box"), (Keys{{"Name", "alpha"}}));
 }
 
-TYPED_TEST(SettingElement, LeavesTheKeysOfItsArgumentAlone) {
+TYPED_TEST(SettingElement, KeepsTheKeysOfItsArgument) {
     const Keys keys = {{"Other", "x"}, {"Name", "alpha"}, {"InstanceID", "/system"}};
     Moniker argument = moniker(keys);
     TypeParam::elementMoniker(this->setting, argument);
@@ -119,14 +119,14 @@ TYPED_TEST(SettingElement, LeavesTheKeysOfItsArgumentAlone) {
     EXPECT_EQ(keysOf(argument), keys);
 }
 
-TYPED_TEST(SettingElement, NeedsNoRecordOfThatIdentifier) {
+TYPED_TEST(SettingElement, NeedsNoRecordWithTheIdentifier) {
     this->fill({"unrelated"});
     typename TypeParam::Setting fresh;
     Moniker argument = moniker({{"Name", "alpha"}});
     EXPECT_EQ(keysOf(TypeParam::elementMoniker(fresh, argument)), (Keys{{"InstanceID", "/system/first%20box"}}));
 }
 
-TYPED_TEST(SettingElement, StandsOnTheRecordThatBelongsToTheComputer) {
+TYPED_TEST(SettingElement, MovesToTheRecordOfTheComputer) {
     this->fill({"unrelated", "/system/second%5Fbox"});
     typename TypeParam::Setting fresh;
     Moniker argument = moniker({{"Name", "beta"}});
@@ -136,7 +136,7 @@ TYPED_TEST(SettingElement, StandsOnTheRecordThatBelongsToTheComputer) {
     EXPECT_EQ(evaluations.size(), 4U) << "the first record is passed over, the second is kept";
 }
 
-TYPED_TEST(SettingElement, CannotBeMadeWhenRecordsAreCountedAndThereAreNone) {
+TYPED_TEST(SettingElement, ThrowsIfTheCountIsNotZeroAndTheTableIsEmpty) {
     this->count() = 1;
     EXPECT_EQ(thrown<InstrumentationException>([] { typename TypeParam::Setting fresh; }),
               Words<typename TypeParam::Store>::noRecords);

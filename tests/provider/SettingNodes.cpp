@@ -1,6 +1,9 @@
 #include "support/AgentEnvironment.h"
 
-/** Two computers, whose paths need an escape in their text form, and a third with the name of the second. */
+/**
+ * Two computers whose paths contain escaped characters in their string form, and a third one with the second one's
+ * name.
+ */
 const char* const agentNodes = R"(
 [[instrumentation.node]]
 type = 1

@@ -1,6 +1,6 @@
-// What the setting elements tell of their work.
+// Log records of the setting elements.
 
-#include "SettingSides.h"
+#include "SettingKinds.h"
 
 #include <gmock/gmock.h>
 
@@ -12,7 +12,7 @@ using namespace providerTest;
 using testing::ElementsAre;
 using testing::ElementsAreArray;
 
-/** Level and text of a record. */
+/** Level and message of a record. */
 struct Told {
     int level;
     std::string text;
@@ -22,13 +22,13 @@ struct Told {
     }
 };
 
-template <class Side>
-class SettingTrace : public SettingElement<Side> {
+template <class Kind>
+class SettingTrace : public SettingElement<Kind> {
 protected:
-    /** What a function of the unit told, all of it under the unit's logger. */
+    /** Returns the records that a function logged. Expects the source file's logger. */
     static std::vector<Told> told(const std::string& function) {
         std::vector<Told> found;
-        for (const LogRecord& record : recordsOf(Side::sourceFile, function)) {
+        for (const LogRecord& record : recordsOf(Kind::sourceFile, function)) {
             EXPECT_EQ(record.logger, "Tarvik.LeaseAndWarrantyProvider");
             found.push_back({record.level, withoutLine(record.text)});
         }
@@ -42,9 +42,9 @@ protected:
     }
 };
 
-TYPED_TEST_SUITE(SettingTrace, SettingSides, SideNames);
+TYPED_TEST_SUITE(SettingTrace, SettingKinds, KindNames);
 
-TYPED_TEST(SettingTrace, NotesItsMakingAndItsEnd) {
+TYPED_TEST(SettingTrace, LogsConstructionAndDestruction) {
     agentEnvironment::forgetLog();
     { typename TypeParam::Setting fresh; }
     for (const char* before : {"", "~"}) {
@@ -55,7 +55,7 @@ TYPED_TEST(SettingTrace, NotesItsMakingAndItsEnd) {
     }
 }
 
-TYPED_TEST(SettingTrace, TellsOfTheWayToTheElement) {
+TYPED_TEST(SettingTrace, LogsTheTranslationToTheElement) {
     Moniker argument = moniker({{"Name", "beta"}});
     const std::string list = this->listOf(" monikerComputer=", argument);
     agentEnvironment::forgetLog();
@@ -71,7 +71,7 @@ TYPED_TEST(SettingTrace, TellsOfTheWayToTheElement) {
     EXPECT_THAT(this->told(TypeParam::toElement), ElementsAreArray(expected));
 }
 
-TYPED_TEST(SettingTrace, TellsOfTheWayToTheComputer) {
+TYPED_TEST(SettingTrace, LogsTheTranslationToTheComputer) {
     Moniker argument = moniker({{"InstanceID", "/system/third"}});
     const std::string list = this->listOf(TypeParam::elementLabel, argument);
     agentEnvironment::forgetLog();
@@ -82,7 +82,7 @@ TYPED_TEST(SettingTrace, TellsOfTheWayToTheComputer) {
                             Told{3000, exiting("getComputerMoniker", TypeParam::sourceFile, list)}));
 }
 
-TYPED_TEST(SettingTrace, ShowsTheElementsFilterSetToTheIdentifier) {
+TYPED_TEST(SettingTrace, LogsTheElementsFilterWithTheIdentifier) {
     agentEnvironment::forgetLog();
     this->toElement({{"Name", "beta"}});
     const std::string list = " filterType=0 reference=/system/second%5Fbox";
@@ -91,14 +91,14 @@ TYPED_TEST(SettingTrace, ShowsTheElementsFilterSetToTheIdentifier) {
                             exiting("setFilter", TypeParam::elementFile, list)));
 }
 
-TYPED_TEST(SettingTrace, ShowsTheFilterSetToTheTextOfNoNodeForAnUnknownComputer) {
+TYPED_TEST(SettingTrace, LogsTheFilterWithTheEmptyPathForAnUnknownComputer) {
     agentEnvironment::forgetLog();
     this->toElement({{"Name", "gamma"}});
     EXPECT_EQ(textsOf(TypeParam::elementFile, "setFilter").at(0),
               entering("setFilter", TypeParam::elementFile, " filterType=0 reference="));
 }
 
-TYPED_TEST(SettingTrace, TellsFailuresAtErrorLevelAndNoExit) {
+TYPED_TEST(SettingTrace, LogsFailuresAtErrorLevelAndNoExit) {
     agentEnvironment::forgetLog();
     Moniker empty;
     EXPECT_THROW(TypeParam::elementMoniker(this->setting, empty), FrameworkException);

@@ -1,6 +1,6 @@
-// What the stores tell of their work.
+// Log records of the stores.
 
-#include "Sides.h"
+#include "RecordKinds.h"
 
 #include <gmock/gmock.h>
 
@@ -12,15 +12,17 @@ using namespace providerTest;
 using testing::ElementsAre;
 using testing::StartsWith;
 
-template <class Side>
-class StoreTrace : public RecordStore<Side> {
+template <class Kind>
+class StoreTrace : public RecordStore<Kind> {
 protected:
-    static std::string source() { return Words<Side>::sourceFile; }
+    static std::string source() { return Words<Kind>::sourceFile; }
     static std::string named(const std::string& before, const std::string& after = {}) {
-        return Words<Side>::with(before, after);
+        return Words<Kind>::with(before, after);
     }
 
-    /** What a function tells during an operation, and that all of it is of the unit's logger at flow level. */
+    /**
+     * Returns the messages that a function logs during an operation. Expects the source file's logger and flow level.
+     */
     template <class Operation>
     static std::vector<std::string> told(const std::string& function, Operation operation) {
         agentEnvironment::forgetLog();
@@ -34,9 +36,9 @@ protected:
     }
 };
 
-TYPED_TEST_SUITE(StoreTrace, Sides, SideNames);
+TYPED_TEST_SUITE(StoreTrace, RecordKinds, KindNames);
 
-TYPED_TEST(StoreTrace, TellsTheCountWhenACursorIsMade) {
+TYPED_TEST(StoreTrace, LogsTheCountWhenACursorIsCreated) {
     this->fill({"A", "B"});
     EXPECT_THAT(this->told(this->named("", "Base"), [] { typename TypeParam::Base base; }),
                 ElementsAre(entering(this->named("", "Base"), this->source()),
@@ -44,7 +46,7 @@ TYPED_TEST(StoreTrace, TellsTheCountWhenACursorIsMade) {
                             exiting(this->named("", "Base"), this->source())));
 }
 
-TYPED_TEST(StoreTrace, TellsAtTheCursorsEndWhetherItChangedSomething) {
+TYPED_TEST(StoreTrace, LogsInTheDestructorWhetherACursorChangedAnything) {
     this->fill({"A"});
     const std::string destructor = this->named("~", "Base");
     EXPECT_THAT(this->told(destructor, [] { typename TypeParam::Base base; }),
@@ -59,7 +61,7 @@ TYPED_TEST(StoreTrace, TellsAtTheCursorsEndWhetherItChangedSomething) {
                             exiting(destructor, this->source())));
 }
 
-TYPED_TEST(StoreTrace, NamesTheOperators) {
+TYPED_TEST(StoreTrace, LogsTheNamesOfOperators) {
     this->fill({"A"});
     typename TypeParam::Base base;
     EXPECT_THAT(this->told("operator bool", [&] { EXPECT_TRUE(stands(base)); }),
@@ -68,7 +70,7 @@ TYPED_TEST(StoreTrace, NamesTheOperators) {
                 ElementsAre(entering("operator++", this->source()), exiting("operator++", this->source())));
 }
 
-TYPED_TEST(StoreTrace, TellsTheIdentifierThatIsSelectedOrMade) {
+TYPED_TEST(StoreTrace, LogsSelectedAndCreatedIdentifiers) {
     typename TypeParam::Base base;
     const std::string create = this->named("create");
     EXPECT_THAT(this->told(create, [&] { TypeParam::create(base, "new one"); }),
@@ -80,7 +82,7 @@ TYPED_TEST(StoreTrace, TellsTheIdentifierThatIsSelectedOrMade) {
                             exiting(select, this->source(), " instanceId=other one")));
 }
 
-TYPED_TEST(StoreTrace, TellsTheCountAfterADeletion) {
+TYPED_TEST(StoreTrace, LogsTheCountAfterADeletion) {
     this->fill({"A", "B"});
     typename TypeParam::Base base;
     const std::string remove = this->named("delete");
@@ -90,7 +92,7 @@ TYPED_TEST(StoreTrace, TellsTheCountAfterADeletion) {
                     exiting(remove, this->source())));
 }
 
-TYPED_TEST(StoreTrace, TellsAPropertyAndItsValueAtEntryAndExit) {
+TYPED_TEST(StoreTrace, LogsAPropertyAndItsValueAtEntryAndExit) {
     this->fill({"A"});
     typename TypeParam::Base base;
     const std::string property = std::to_string(static_cast<int>(TypeParam::text));
@@ -103,7 +105,7 @@ TYPED_TEST(StoreTrace, TellsAPropertyAndItsValueAtEntryAndExit) {
                             exiting("getProperty", this->source(), " property=" + property + " value=ACME Co")));
 }
 
-TYPED_TEST(StoreTrace, TellsNumbersAsTheyAre) {
+TYPED_TEST(StoreTrace, LogsNumbersUnchanged) {
     this->fill({"A"});
     typename TypeParam::Base base;
     const std::string list = " property=" + std::to_string(static_cast<int>(TypeParam::number)) + " value=4294967295";
@@ -112,7 +114,7 @@ TYPED_TEST(StoreTrace, TellsNumbersAsTheyAre) {
         ElementsAre(entering("setProperty", this->source(), list), exiting("setProperty", this->source(), list)));
 }
 
-/** Of an operation that fails: its lines but the first, which are its failure at error level and no exit. */
+/** Expects that a failed operation logs its failure at error level after its entry, and no exit. */
 void expectFailureTold(const std::string& source, const std::string& function, const std::string& text) {
     const auto records = recordsOf(source, function);
     ASSERT_EQ(records.size(), 2U) << function;
@@ -122,7 +124,7 @@ void expectFailureTold(const std::string& source, const std::string& function, c
     EXPECT_EQ(records[1].level, 3000);
 }
 
-TYPED_TEST(StoreTrace, TellsFailuresAtErrorLevelAndNoExit) {
+TYPED_TEST(StoreTrace, LogsFailuresAtErrorLevelAndNoExit) {
     this->fill({"A"});
     typename TypeParam::Base base;
     agentEnvironment::forgetLog();
@@ -138,7 +140,7 @@ TYPED_TEST(StoreTrace, TellsFailuresAtErrorLevelAndNoExit) {
     expectFailureTold(this->source(), this->named("delete"), Words<TypeParam>::notAvailable);
 }
 
-TYPED_TEST(StoreTrace, NamesTheStreamOperatorsWithStreamAndRecord) {
+TYPED_TEST(StoreTrace, LogsStreamOperatorsWithStreamAndRecord) {
     const std::string streamed = " " + this->named("", "=");
     const std::string label = static_cast<char>(std::tolower(TypeParam::name[0])) + std::string(TypeParam::name + 1);
     typename TypeParam::Unit unit("A");
@@ -160,7 +162,7 @@ TYPED_TEST(StoreTrace, NamesTheStreamOperatorsWithStreamAndRecord) {
                             exiting("operator>>", this->source(), sourceAddress.str() + record.str())));
 }
 
-TYPED_TEST(StoreTrace, TellsOfRecordsMadeCopiedAndAssigned) {
+TYPED_TEST(StoreTrace, LogsConstructionCopyAndAssignmentOfRecords) {
     const std::string unit = this->named("", "Unit");
     EXPECT_THAT(this->told(unit, [] { const typename TypeParam::Unit made; }),
                 ElementsAre(entering(unit, this->source()), exiting(unit, this->source())));
@@ -178,7 +180,7 @@ TYPED_TEST(StoreTrace, TellsOfRecordsMadeCopiedAndAssigned) {
                             exiting("operator=", this->source(), list.str())));
 }
 
-TYPED_TEST(StoreTrace, TellsOfTheTableMadeAndReleased) {
+TYPED_TEST(StoreTrace, LogsConstructionAndDestructionOfTheTable) {
     const std::string cache = this->named("", "Cache");
     EXPECT_THAT(this->told(cache, [] { typename TypeParam::Cache made; }),
                 ElementsAre(entering(cache, this->source()), exiting(cache, this->source())));
@@ -187,7 +189,7 @@ TYPED_TEST(StoreTrace, TellsOfTheTableMadeAndReleased) {
                 ElementsAre(entering(destructor, this->source()), exiting(destructor, this->source())));
 }
 
-TYPED_TEST(StoreTrace, TellsTheSameOfACountOfZeroAsOfNoFile) {
+TYPED_TEST(StoreTrace, LogsACountOfZeroLikeAMissingFile) {
     const auto loaded = [] {
         agentEnvironment::forgetLog();
         { typename TypeParam::Cache cache; }
@@ -211,12 +213,12 @@ TYPED_TEST(StoreTrace, IsTheSameOnBothChannels) {
     EXPECT_EQ(texts("log"), texts("trace"));
 }
 
-using LeaseFlagTrace = StoreTrace<LeaseSide>;
+using LeaseFlagTrace = StoreTrace<LeaseKind>;
 
-TEST_F(LeaseFlagTrace, TellsFlagsAsNumbers) {
+TEST_F(LeaseFlagTrace, LogsFlagsAsNumbers) {
     fill({"A"});
     LeaseBase base;
-    EXPECT_THAT(told("setProperty", [&] { base.setProperty(LeaseSide::Property::RenewalOption, true); }),
+    EXPECT_THAT(told("setProperty", [&] { base.setProperty(LeaseKind::Property::RenewalOption, true); }),
                 ElementsAre(entering("setProperty", source(), " property=11 value=1"),
                             exiting("setProperty", source(), " property=11 value=1")));
 }

@@ -11,7 +11,7 @@
 #include <string>
 #include <vector>
 
-/** What the tests of the provider's units share. */
+/** Helpers for the tests of the provider's classes. */
 namespace providerTest {
 
 using agentEnvironment::LogRecord;
@@ -25,13 +25,16 @@ inline void write(const std::filesystem::path& file, const std::string& content)
     std::ofstream(file, std::ios::binary) << content;
 }
 
-/** Makes a file that nobody can open, the superuser included. */
+/** Creates a directory at the path, which even the superuser cannot open as a file. */
 inline void blockWithDirectory(const std::filesystem::path& file) {
     std::filesystem::remove_all(file);
     std::filesystem::create_directory(file);
 }
 
-/** The text of the exception that an operation throws; empty when it throws none. Other classes pass through. */
+/**
+ * Returns the message of the exception that an operation throws; empty if it throws none. Propagates other exception
+ * classes.
+ */
 template <class Exception, class Operation>
 std::string thrown(Operation operation) {
     try {
@@ -42,19 +45,19 @@ std::string thrown(Operation operation) {
     return {};
 }
 
-/** Whether a cursor stands on something. Its own operator may move it, which a test assertion forbids. */
+/** Returns whether a cursor has a current object. Its operator bool may move it, so test assertions cannot call it. */
 template <class Cursor>
 bool stands(Cursor& cursor) {
     return cursor;
 }
 
-/** A trace text with its line numbers as N, which tests do not depend on. */
+/** Replaces line numbers in a trace message by N. */
 inline std::string withoutLine(const std::string& text) {
     static const std::regex number("(\\[Line: |, Line: |at line )[0-9]+");
     return std::regex_replace(text, number, "$1N");
 }
 
-/** The texts of one channel's records, without line numbers, in the order written. */
+/** Returns the messages of a channel's records in order, without line numbers. */
 inline std::vector<std::string> texts(const std::string& channel = "log") {
     std::vector<std::string> found;
     for (const LogRecord& record : agentEnvironment::log()) {
@@ -65,7 +68,7 @@ inline std::vector<std::string> texts(const std::string& channel = "log") {
     return found;
 }
 
-/** The records of one channel that a function of a unit wrote. */
+/** Returns the records of a channel that a function of a source file wrote. */
 inline std::vector<LogRecord> recordsOf(const std::string& file, const std::string& function,
                                         const std::string& channel = "log") {
     std::vector<LogRecord> found;
@@ -77,7 +80,7 @@ inline std::vector<LogRecord> recordsOf(const std::string& file, const std::stri
     return found;
 }
 
-/** Their texts, without line numbers. */
+/** Returns their messages without line numbers. */
 inline std::vector<std::string> textsOf(const std::string& file, const std::string& function) {
     std::vector<std::string> found;
     for (const LogRecord& record : recordsOf(file, function)) {
@@ -86,7 +89,7 @@ inline std::vector<std::string> textsOf(const std::string& file, const std::stri
     return found;
 }
 
-/** Entry and exit of a function, as they stand in the log; the list, if any, with its leading blank. */
+/** Return the entry and exit messages of a function. A parameter list must start with a blank. */
 inline std::string entering(const std::string& function, const std::string& file, const std::string& list = {}) {
     return "ENTERING: " + function + "() in " + file + " [Line: N]" +
            (list.empty() ? std::string() : ",Parameters List: " + list);
@@ -105,7 +108,7 @@ inline std::string message(const std::string& text, const std::string& file) {
     return "MESSAGE [File: " + file + ", Line: N]: " + text;
 }
 
-/** An empty data directory and log for each test. */
+/** Provides an empty data directory and an empty log for each test. */
 class CleanAgent : public testing::Test {
 protected:
     void SetUp() override { agentEnvironment::clear(); }

@@ -22,19 +22,19 @@ struct KindRow {
     const char* withList;
 };
 
-/** As its number; GoogleTest would print the bytes, those between the members too. */
+/** Prints the number. GoogleTest would print all bytes, including uninitialized padding. */
 void PrintTo(const KindRow& row, std::ostream* stream) {
     *stream << row.kind;
 }
 
 class TraceKind : public testing::TestWithParam<KindRow> {};
 
-TEST_P(TraceKind, HasItsText) {
+TEST_P(TraceKind, HasItsFormat) {
     const auto kind = static_cast<MessageType>(GetParam().kind);
     EXPECT_STREQ(trace("createLease", "LeaseBase.cpp", 240, kind), GetParam().plain);
 }
 
-TEST_P(TraceKind, HasItsTextWithTheParameterListLast) {
+TEST_P(TraceKind, HasItsFormatWithTheParameterListLast) {
     const auto kind = static_cast<MessageType>(GetParam().kind);
     EXPECT_STREQ(tracepara("createLease", "LeaseBase.cpp", 240, " instanceId=A", kind), GetParam().withList);
 }
@@ -60,22 +60,22 @@ INSTANTIATE_TEST_SUITE_P(
 INSTANTIATE_TEST_SUITE_P(UnlistedIsEntering, TraceKind,
                          testing::Values(countingAsEntering(7), countingAsEntering(4), countingAsEntering(-1)));
 
-TEST(TraceFormat, PutsTheFileOfAMessageFirstAndItsTextLast) {
+TEST(TraceFormat, StartsAMessageWithTheFileAndEndsWithTheString) {
     EXPECT_STREQ(trace("Lease record not available", "LeaseAndWarrantyProvider.cpp", 240, KO::MT_MESSAGE),
                  "MESSAGE [File: LeaseAndWarrantyProvider.cpp, Line: 240]: Lease record not available");
 }
 
-TEST(TraceFormat, ShowsATextVariable) {
+TEST(TraceFormat, FormatsAStringVariable) {
     EXPECT_STREQ(trace("Name", "LeaseSetting.cpp", 61, "testhost"),
                  "VARIABLE: 'Name' has Value 'testhost' at line 61 in LeaseSetting.cpp");
 }
 
-TEST(TraceFormat, ShowsANumberVariable) {
+TEST(TraceFormat, FormatsANumberVariable) {
     EXPECT_STREQ(trace("classId", "LeaseAndWarrantyProvider.cpp", 7, 209U),
                  "VARIABLE: 'classId' has Value '209' at line 7 in LeaseAndWarrantyProvider.cpp");
 }
 
-TEST(TraceFormat, ShowsNumbersAsSigned) {
+TEST(TraceFormat, FormatsNumbersAsSigned) {
     EXPECT_STREQ(trace("count", "A.cpp", 4294967295U, 4294967294U),
                  "VARIABLE: 'count' has Value '-2' at line -1 in A.cpp");
 }
@@ -85,12 +85,12 @@ TEST(TraceFormat, KeepsBytesOfAnyEncoding) {
                  "VARIABLE: 'name' has Value 'M\xC3\xBCller \xFF\x01' at line 1 in A.cpp");
 }
 
-TEST(TraceFormat, TakesPercentSignsOfItsArgumentsLiterally) {
+TEST(TraceFormat, CopiesPercentSignsLiterally) {
     EXPECT_STREQ(tracepara("f", "A.cpp", 1, " value=%s%n", KO::MT_ENTERING),
                  "ENTERING: f() in A.cpp [Line: 1],Parameters List:  value=%s%n");
 }
 
-/** A text of a length with no repetition that would hide a shift. */
+/** Returns a nonrepeating string, so that a shift is detected. */
 std::string longText(std::size_t length) {
     std::string text;
     while (text.size() < length) {
@@ -99,7 +99,7 @@ std::string longText(std::size_t length) {
     return text.substr(0, length);
 }
 
-TEST(TraceFormat, CutsEveryTextAt511Characters) {
+TEST(TraceFormat, TruncatesStringsAt511Characters) {
     const std::string text = longText(2000);
     const std::pair<std::string, const char*> cases[] = {
         {"ENTERING: " + text, trace(text.c_str(), "A.cpp", 1, KO::MT_ENTERING)},
@@ -113,14 +113,14 @@ TEST(TraceFormat, CutsEveryTextAt511Characters) {
     }
 }
 
-TEST(TraceFormat, CutsNothingFromATextOf511Characters) {
+TEST(TraceFormat, KeepsStringsOf511Characters) {
     const std::string head = "MESSAGE [File: A.cpp, Line: 1]: ";
     const std::string text = longText(511 - head.size());
     EXPECT_EQ(trace(text.c_str(), "A.cpp", 1, KO::MT_MESSAGE), head + text);
     EXPECT_EQ(trace((text + "x").c_str(), "A.cpp", 1, KO::MT_MESSAGE), head + text);
 }
 
-TEST(TraceFormat, WritesNothingBesideItsOwnBuffer) {
+TEST(TraceFormat, WritesOnlyToItsOwnBuffer) {
     const char* const list = tracepara("f", "A.cpp", 1, "list", KO::MT_EXITING);
     const char* const text = trace("v", "A.cpp", 1, "text");
     const char* const number = trace("v", "A.cpp", 1, 5U);
@@ -130,21 +130,21 @@ TEST(TraceFormat, WritesNothingBesideItsOwnBuffer) {
     EXPECT_STREQ(number, "VARIABLE: 'v' has Value '5' at line 1 in A.cpp");
 }
 
-TEST(TraceFormat, ClearsTheWholeBufferBeforeEachText) {
+TEST(TraceFormat, ClearsTheBufferBeforeEachString) {
     trace(longText(600).c_str(), "A.cpp", 1, KO::MT_MESSAGE);
     const char* const buffer = trace("f", "A.cpp", 1, KO::MT_METHOD);
     const char* const end = buffer + std::string(buffer).size();
     EXPECT_TRUE(std::all_of(end, buffer + 512, [](char byte) { return byte == '\0'; }));
 }
 
-TEST(TraceFormat, GivesEachFunctionItsOneBuffer) {
+TEST(TraceFormat, UsesOneBufferPerFunction) {
     const char* const first = trace("f", "A.cpp", 1, KO::MT_ENTERING);
     EXPECT_EQ(first, trace("g", "B.cpp", 2, KO::MT_MESSAGE));
     EXPECT_NE(first, tracepara("f", "A.cpp", 1, "", KO::MT_ENTERING));
     EXPECT_NE(trace("v", "A.cpp", 1, "text"), trace("v", "A.cpp", 1, 5U));
 }
 
-TEST(TraceFormat, GivesEachSourceUnitItsOwnBuffers) {
+TEST(TraceFormat, UsesSeparateBuffersPerTranslationUnit) {
     const char* const own = trace("own", "A.cpp", 1, KO::MT_ENTERING);
     const char* const others = traceOfOtherUnit("theirs");
     EXPECT_STREQ(own, "ENTERING: own() in A.cpp [Line: 1]");

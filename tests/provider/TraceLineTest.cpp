@@ -20,7 +20,7 @@ const TraceSource traceSource{loggerOfTest, "TraceLineTest.cpp"};
 
 class TraceLine : public CleanAgent {};
 
-TEST_F(TraceLine, GoesToTheLogChannelAndThenToTheTraceChannel) {
+TEST_F(TraceLine, IsWrittenToTheLogChannelAndThenToTheTraceChannel) {
     traceMessage({&traceSource, Level::error, "aFunction", 17}, "a text");
     const auto records = agentEnvironment::log();
     ASSERT_EQ(records.size(), 2U);
@@ -36,7 +36,7 @@ TEST_F(TraceLine, GoesToTheLogChannelAndThenToTheTraceChannel) {
     }
 }
 
-TEST_F(TraceLine, KnowsItsFunctionAndLineFromThePlaceOfTheCall) {
+TEST_F(TraceLine, HasTheFunctionAndLineOfTheCall) {
     traceMethod(at(traceSource));
     const unsigned int line = __LINE__ - 1;
     const auto records = agentEnvironment::log();
@@ -48,22 +48,22 @@ TEST_F(TraceLine, KnowsItsFunctionAndLineFromThePlaceOfTheCall) {
     EXPECT_EQ(records[0].level, 4000);
 }
 
-TEST_F(TraceLine, KeepsControlCharactersOfATextFromForgingRecords) {
+TEST_F(TraceLine, EscapesControlCharacters) {
     traceVariable(at(traceSource), "value", std::string("one\ntwo\tthree"));
     EXPECT_THAT(texts(), ElementsAre(variable("value", "one\\ntwo\\tthree", "TraceLineTest.cpp")));
 }
 
-TEST_F(TraceLine, ShowsAFlagAsANumber) {
+TEST_F(TraceLine, FormatsAFlagAsANumber) {
     traceVariable(at(traceSource), "flag", true);
     EXPECT_THAT(texts(), ElementsAre(variable("flag", "1", "TraceLineTest.cpp")));
 }
 
-TEST_F(TraceLine, IsLostWithoutHarmWhenItsLevelIsNotAdmitted) {
+TEST_F(TraceLine, IsDroppedIfItsLevelIsNotAdmitted) {
     traceMessage({&traceSource, 10000, "aFunction", 1}, "a text");
     EXPECT_THAT(agentEnvironment::log(), IsEmpty());
 }
 
-TEST_F(TraceLine, IsCutAt511Characters) {
+TEST_F(TraceLine, IsTruncatedAt511Characters) {
     const std::string longList(600, 'x');
     traceLine({&traceSource, Level::flow, "f", 1}, MT_ENTERING, label::value, longList);
     const auto shown = texts();
@@ -76,14 +76,14 @@ TEST_F(TraceLine, IsCutAt511Characters) {
 
 enum class Colour : int { green = 6 };
 
-TEST_F(TraceLine, ShowsTheValuesOfAParameterListBehindTheirLabels) {
+TEST_F(TraceLine, FormatsParameterListsAsLabelsAndValues) {
     traceLine(at(traceSource), MT_MESSAGE, label::property, Colour::green, label::value, std::string("a b"),
               label::instanceId, "text", label::filterTypeBare, 4294967295U);
     EXPECT_THAT(texts(), ElementsAre("MESSAGE [File: TraceLineTest.cpp, Line: N]: TestBody,Parameters List:  "
                                      "property=6 value=a b instanceId=textFilterType=4294967295"));
 }
 
-TEST_F(TraceLine, ShowsAPointerAsAnAddress) {
+TEST_F(TraceLine, FormatsAPointerAsAnAddress) {
     const int target = 0;
     const void* const nothing = nullptr;
     traceLine(at(traceSource), MT_ENTERING, label::broker, &target, label::context, nothing);
@@ -98,7 +98,7 @@ void leaveNormally() {
     traceMethod(at(traceSource));
 }
 
-TEST_F(TraceLine, MarksEntryAndExitOfAFunction) {
+TEST_F(TraceLine, IsWrittenAtEntryAndExitOfAFunction) {
     leaveNormally();
     EXPECT_THAT(texts(), ElementsAre(entering("leaveNormally", "TraceLineTest.cpp"),
                                      "METHOD: leaveNormally() was invoked in TraceLineTest.cpp [Line: N]",
@@ -111,7 +111,7 @@ void change(std::string& value) {
     value = "after";
 }
 
-TEST_F(TraceLine, ReadsTheParametersAgainAtExit) {
+TEST_F(TraceLine, HasTheCurrentParametersAtTheExit) {
     std::string value = "before";
     change(value);
     EXPECT_THAT(texts(), ElementsAre(entering("change", "TraceLineTest.cpp", " value=before"),
@@ -123,7 +123,7 @@ void nameAsGiven() {
     const Traced traced(at(traceSource, Level::flow, "~Name"), label::value, std::string("kept until the exit"));
 }
 
-TEST_F(TraceLine, KeepsTemporaryParametersUntilTheExit) {
+TEST_F(TraceLine, HasTemporaryParametersAtTheExit) {
     nameAsGiven();
     EXPECT_THAT(texts(), ElementsAre(entering("~Name", "TraceLineTest.cpp", " value=kept until the exit"),
                                      exiting("~Name", "TraceLineTest.cpp", " value=kept until the exit")));
@@ -134,7 +134,7 @@ void leaveByException() {
     fail<FrameworkException>(at(traceSource), "It failed.");
 }
 
-TEST_F(TraceLine, MarksNoExitWhenAnExceptionLeaves) {
+TEST_F(TraceLine, IsNotWrittenAtTheExitByAnException) {
     EXPECT_EQ(thrown<FrameworkException>(leaveByException), "It failed.");
     EXPECT_THAT(texts(), ElementsAre(entering("leaveByException", "TraceLineTest.cpp"),
                                      message("It failed.", "TraceLineTest.cpp")));
@@ -149,7 +149,7 @@ void swallow() {
     }
 }
 
-TEST_F(TraceLine, MarksTheExitOfAFunctionThatCatchesAnException) {
+TEST_F(TraceLine, IsWrittenAtTheExitAfterACaughtException) {
     swallow();
     EXPECT_THAT(texts(),
                 ElementsAre(entering("swallow", "TraceLineTest.cpp"), exiting("swallow", "TraceLineTest.cpp")));
@@ -159,7 +159,7 @@ struct TracedAtDestruction {
     ~TracedAtDestruction() { leaveNormally(); }
 };
 
-TEST_F(TraceLine, MarksTheExitOfAFunctionThatRunsWhileAnExceptionLeaves) {
+TEST_F(TraceLine, IsWrittenAtTheExitDuringUnwinding) {
     try {
         const TracedAtDestruction leaving;
         throw ProviderException("on its way");
@@ -168,7 +168,7 @@ TEST_F(TraceLine, MarksTheExitOfAFunctionThatRunsWhileAnExceptionLeaves) {
     EXPECT_THAT(texts(), testing::Contains(exiting("leaveNormally", "TraceLineTest.cpp")));
 }
 
-TEST_F(TraceLine, TellsAFailureAtErrorLevelBeforeItIsThrown) {
+TEST_F(TraceLine, IsWrittenAtErrorLevelBeforeAFailureIsThrown) {
     EXPECT_EQ(thrown<InstrumentationException>(
                   [] { fail<InstrumentationException>(at(traceSource, Level::flow, "find"), "Not there"); }),
               "Not there");
@@ -202,7 +202,7 @@ void expectMarkers(const std::vector<Marker>& expected) {
 
 const std::string rule(78, '=');
 
-TEST_F(TraceLine, MarksTheEntryOfARequestWithARuleAndTheEnteringLine) {
+TEST_F(TraceLine, StartsARequestWithASeparatorAndTheEnteringLine) {
     markProviderEntry(loggerOfTest, "LeaseAndWarranty_GetInstance", "Entry.cpp", 41);
     const std::string line = "ENTERING: LeaseAndWarranty_GetInstance() in Entry.cpp [Line: 41]";
     expectMarkers({{"log", "markProviderEntry", 336, rule},
@@ -211,7 +211,7 @@ TEST_F(TraceLine, MarksTheEntryOfARequestWithARuleAndTheEnteringLine) {
                    {"trace", "markProviderEntry", 337, line}});
 }
 
-TEST_F(TraceLine, MarksTheExitOfARequestWithTheExitingLineAndARule) {
+TEST_F(TraceLine, EndsARequestWithTheExitingLineAndASeparator) {
     markProviderExit(loggerOfTest, "LeaseAndWarranty_GetInstance", "Entry.cpp", 41);
     const std::string line = "EXITING: LeaseAndWarranty_GetInstance() in Entry.cpp [Line: 41]";
     expectMarkers({{"log", "markProviderExit", 348, line},
@@ -234,7 +234,7 @@ struct ExceptionNames {
 
 TYPED_TEST_SUITE(ThrownMessage, ExceptionClasses, ExceptionNames);
 
-TYPED_TEST(ThrownMessage, IsWhatTheExceptionAndItsCopiesSay) {
+TYPED_TEST(ThrownMessage, IsReturnedByTheExceptionAndItsCopies) {
     std::string text = "Lease record not available";
     const TypeParam original(text.c_str());
     text = "something else";

@@ -1,4 +1,4 @@
-// Tracing to a logging library that can tell which records it admits.
+// Tracing with a logging library that provides RZLogger::admits.
 
 #include "LogDouble.h"
 #include "Trace.h"
@@ -16,7 +16,7 @@ using testing::IsEmpty;
 const std::string loggerOfTest("Test.Logger");
 const TraceSource traceSource{loggerOfTest, "Unit.cpp"};
 
-/** A value that counts how often it is shown. */
+/** A value that counts how often it is formatted. */
 struct Shown {
     int& times;
 };
@@ -46,7 +46,7 @@ protected:
     int timesShown = 0;
 };
 
-TEST_F(TraceQuery, SparesTheMakingOfLinesThatNobodyWillRead) {
+TEST_F(TraceQuery, DoesNotFormatUnwantedLines) {
     logDouble::admittedLevel = Level::flow - 1;
     traceEverything();
     EXPECT_THAT(logDouble::records, IsEmpty());
@@ -54,14 +54,14 @@ TEST_F(TraceQuery, SparesTheMakingOfLinesThatNobodyWillRead) {
     EXPECT_EQ(logDouble::buffersMade, 0);
 }
 
-TEST_F(TraceQuery, GivesEveryLineThatIsAdmitted) {
+TEST_F(TraceQuery, WritesEveryAdmittedLine) {
     logDouble::admittedLevel = Level::flow;
     traceEverything();
     EXPECT_EQ(logDouble::records.size(), 18U);
     EXPECT_EQ(timesShown, 2);
 }
 
-TEST_F(TraceQuery, AsksForTheLevelOfEachLine) {
+TEST_F(TraceQuery, QueriesTheLevelOfEachLine) {
     logDouble::admittedLevel = Level::error;
     const CallSite site{&traceSource, Level::flow, "work", 7};
     EXPECT_THROW(fail<std::runtime_error>(site, "It failed."), std::runtime_error);
@@ -69,7 +69,7 @@ TEST_F(TraceQuery, AsksForTheLevelOfEachLine) {
                                                 "trace MESSAGE [File: Unit.cpp, Line: 7]: It failed."));
 }
 
-TEST_F(TraceQuery, MarksNoExitOfWhatWasNotSeenToBeEntered) {
+TEST_F(TraceQuery, WritesNoExitWithoutAnEntry) {
     logDouble::admittedLevel = Level::error;
     {
         const Traced traced(CallSite{&traceSource, Level::flow, "work", 7});

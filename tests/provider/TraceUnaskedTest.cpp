@@ -1,4 +1,4 @@
-// Tracing to a logging library that cannot tell which records it admits.
+// Tracing with a logging library that does not provide RZLogger::admits.
 
 #include "LogDouble.h"
 #include "Trace.h"
@@ -13,7 +13,7 @@ using testing::ElementsAre;
 const std::string loggerOfTest("Test.Logger");
 const TraceSource traceSource{loggerOfTest, "Unit.cpp"};
 
-TEST(TraceUnasked, GivesEveryLineWhateverItsLevel) {
+TEST(TraceUnasked, WritesLinesOfEveryLevel) {
     { const Traced traced(CallSite{&traceSource, 10000, "work", 7}, label::value, 5); }
     EXPECT_THAT(logDouble::records,
                 ElementsAre("log ENTERING: work() in Unit.cpp [Line: 7],Parameters List:  value=5",

@@ -1,4 +1,4 @@
-// A system without a vendor: what cannot be read counts as passed.
+// A system without a vendor: filters pass if their property cannot be read.
 
 #include "AssetSupport.h"
 
@@ -29,14 +29,14 @@ TEST_F(VendorlessAsset, PassesEveryVendorFilter) {
     }
 }
 
-TEST_F(VendorlessAsset, StillFailsAnotherFilter) {
+TEST_F(VendorlessAsset, FailsOtherFilters) {
     AssetIDDetails element;
     element.setFilter(AssetIDDetails::FILTER_VENDOR, "anybody");
     element.setFilter(AssetIDDetails::FILTER_NAME, "otherhost");
     EXPECT_FALSE(stands(element));
 }
 
-TEST_F(VendorlessAsset, HasNoVendorAndLeavesTheTextAlone) {
+TEST_F(VendorlessAsset, HasNoVendorAndKeepsTheArgument) {
     const AssetIDDetails element;
     std::string text = "before";
     EXPECT_FALSE(element.getVendor(text));

@@ -1,57 +1,57 @@
-// What only the warranty file has: its four lines in their order.
+// Properties of the warranty file only: the order of the four lines.
 
-#include "Sides.h"
+#include "RecordKinds.h"
 
 namespace {
 
 using namespace providerTest;
 
-using WarrantyFile = RecordStore<WarrantySide>;
+using WarrantyFile = RecordStore<WarrantyKind>;
 
-TEST_F(WarrantyFile, StartsARecordWithNumbersZeroAndTextsEmpty) {
+TEST_F(WarrantyFile, InitializesNewRecordsWithZeroAndEmptyStrings) {
     const WarrantyUnit defaults;
-    EXPECT_EQ(WarrantySide::members(defaults), std::make_tuple(true, 0U, std::string(), std::string(), std::string()));
+    EXPECT_EQ(WarrantyKind::members(defaults), std::make_tuple(true, 0U, std::string(), std::string(), std::string()));
     const WarrantyUnit named("warranty 1");
-    EXPECT_EQ(WarrantySide::members(named),
+    EXPECT_EQ(WarrantyKind::members(named),
               std::make_tuple(true, 0U, std::string("warranty 1"), std::string(), std::string()));
 }
 
-TEST_F(WarrantyFile, HoldsFourLinesInFileOrder) {
+TEST_F(WarrantyFile, ContainsFourLinesPerRecordInFileOrder) {
     WarrantyUnit unit("warranty 1");
     unit.Warrantor = "Acme Service";
     unit.CommencementDate = "20240101000000.000000+060";
     unit.Duration = 24;
     EXPECT_EQ(written(unit), "warranty_1\nAcme_Service\n20240101000000.000000+060\n24\n");
-    EXPECT_EQ(WarrantySide::members(reread(unit)), WarrantySide::members(unit));
+    EXPECT_EQ(WarrantyKind::members(reread(unit)), WarrantyKind::members(unit));
 }
 
-TEST_F(WarrantyFile, HoldsFiveLinesForTheOnlyRecord) {
+TEST_F(WarrantyFile, ContainsFiveLinesForASingleRecord) {
     {
         WarrantyBase base;
         base.createWarranty("W1");
-        base.setProperty(WarrantySide::Property::Warrantor, std::string("Acme Service"));
+        base.setProperty(WarrantyKind::Property::Warrantor, std::string("Acme Service"));
     }
     EXPECT_EQ(file(), "1\nW1\nAcme_Service\n00000000000000.000000-000\n0\n");
 }
 
-TEST_F(WarrantyFile, StopsReadingAtWhatIsNoUnsignedNumber) {
+TEST_F(WarrantyFile, StopsReadingAtAnInvalidNumber) {
     for (const char* text : {"x", "-5", "-0", "+", "+-5", "+4294967296", "4294967296", "true"}) {
         SCOPED_TRACE(text);
         const auto cache = load("2\nA\nAy\n20240101000000.000000+000\n" + std::string(text) +
                                 "\nB\nBee\n20250101000000.000000+000\n7\n");
         ASSERT_EQ(cache->table.size(), 2U);
-        EXPECT_EQ(WarrantySide::members(cache->table[0]), std::make_tuple(true, 0U, std::string("A"), std::string("Ay"),
+        EXPECT_EQ(WarrantyKind::members(cache->table[0]), std::make_tuple(true, 0U, std::string("A"), std::string("Ay"),
                                                                           std::string("20240101000000.000000+000")));
-        EXPECT_EQ(WarrantySide::members(cache->table[1]), WarrantySide::members(cache->table[0]));
+        EXPECT_EQ(WarrantyKind::members(cache->table[1]), WarrantyKind::members(cache->table[0]));
     }
 }
 
-TEST_F(WarrantyFile, IsReadAndWrittenByteForByte) {
+TEST_F(WarrantyFile, KeepsItsBytesWhenReadAndWritten) {
     const std::string content = contentOf(std::filesystem::path(PROVIDER_TEST_DATA) / "Warranty.dat");
     ASSERT_FALSE(content.empty());
     const auto cache = load(content);
     ASSERT_EQ(cache->table.size(), 3U);
-    EXPECT_EQ(WarrantySide::members(cache->table[0]),
+    EXPECT_EQ(WarrantyKind::members(cache->table[0]),
               std::make_tuple(true, 4294967295U, std::string("/system/computer"), std::string("Acme Service & Co"),
                               std::string("20240229123000.000000+060")));
     EXPECT_EQ(cache->table[1].Warrantor, "");

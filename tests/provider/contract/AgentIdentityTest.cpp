@@ -5,7 +5,7 @@
 #include <algorithm>
 #include <filesystem>
 
-// The agent's own instance, VELKO_OstrelAgent.
+// The agent's instance, VELKO_OstrelAgent.
 
 namespace contract {
 namespace {
@@ -30,7 +30,7 @@ protected:
         return testsupport::objectPath(nameSpace, className, std::move(keys));
     }
 
-    /** The agent's keys, with some of them given another value. */
+    /** Returns the agent's keys with some values replaced. */
     static std::vector<NamedValue> keys(const std::vector<NamedValue>& changes = {}) {
         std::vector<NamedValue> all{named("Name", text("Test Agent")), named("IdentifyingNumber", text("ID-1")),
                                     named("ProductName", text("Test Agent")), named("Vendor", text("VEL")),
@@ -43,7 +43,7 @@ protected:
         return all;
     }
 
-    /** Whether a path with these keys is the agent's. Fails unless the answer is one of the two possible ones. */
+    /** Returns whether GetInstance returns the agent for a path with these keys. Fails on any other response. */
     bool isTheAgent(const std::vector<NamedValue>& keysOfPath) {
         agentEnvironment::forgetLog();
         const Outcome outcome = provider().getInstance(path(keysOfPath));
@@ -59,7 +59,7 @@ protected:
         return found;
     }
 
-    /** What was compared in the request before, in order: the types of the filters. */
+    /** Returns the filter types that the last request compared, in order. */
     static std::vector<std::string> comparedTypes() {
         std::vector<std::string> types;
         for (const LogRecord& record : logOf()) {
@@ -92,7 +92,7 @@ TEST_F(AgentIdentityTest, ItsPathHasFiveKeys) {
     }
 }
 
-TEST_F(AgentIdentityTest, ItsInstanceHasNineTextsInOrder) {
+TEST_F(AgentIdentityTest, ItsInstanceHasNineStringsInOrder) {
     const auto instances = provider().enumerateInstances(classPath(className)).instances();
     ASSERT_EQ(instances.size(), 1U);
     EXPECT_EQ(testsupport::toText(instances[0].path), testsupport::toText(path(keys())));
@@ -111,7 +111,7 @@ TEST_F(AgentIdentityTest, ItIsInTheRequestsNamespace) {
     EXPECT_EQ(paths[0].nameSpace, "root/other");
 }
 
-TEST_F(AgentIdentityTest, ItIsGotByAllItsKeys) {
+TEST_F(AgentIdentityTest, ItIsReturnedForAllItsKeys) {
     EXPECT_TRUE(isTheAgent(keys()));
     const auto got = provider().getInstance(path(keys())).instances();
     const auto enumerated = provider().enumerateInstances(classPath(className)).instances();
@@ -119,33 +119,33 @@ TEST_F(AgentIdentityTest, ItIsGotByAllItsKeys) {
     EXPECT_EQ(shown(got[0].properties), shown(enumerated.at(0).properties));
 }
 
-TEST_F(AgentIdentityTest, OneWrongKeyIsEnoughToMissIt) {
+TEST_F(AgentIdentityTest, ItIsNotReturnedIfOneKeyDiffers) {
     for (const char* name : {"Name", "IdentifyingNumber", "ProductName", "Vendor", "Version"}) {
         EXPECT_FALSE(isTheAgent(keys({named(name, text("other"))}))) << name;
         EXPECT_FALSE(isTheAgent(keys({named(name, text(""))}))) << name;
     }
 }
 
-TEST_F(AgentIdentityTest, EachKeyIsEnoughToFindIt) {
+TEST_F(AgentIdentityTest, ItIsReturnedForASingleKey) {
     for (const NamedValue& key : keys()) {
         EXPECT_TRUE(isTheAgent({key})) << key.name;
     }
 }
 
-TEST_F(AgentIdentityTest, EachKeyAloneIsCompared) {
+TEST_F(AgentIdentityTest, EachKeyIsComparedIndividually) {
     for (const char* name : {"Name", "IdentifyingNumber", "ProductName", "Vendor", "Version"}) {
         EXPECT_FALSE(isTheAgent({named(name, text("other"))})) << name;
     }
 }
 
-TEST_F(AgentIdentityTest, LetterCaseOfValuesCounts) {
+TEST_F(AgentIdentityTest, ValuesAreCaseSensitive) {
     EXPECT_FALSE(isTheAgent({named("Name", text("test agent"))}));
     EXPECT_FALSE(isTheAgent({named("Vendor", text("vel"))}));
     EXPECT_FALSE(isTheAgent({named("Version", text("4.2.0 "))}));
     EXPECT_FALSE(isTheAgent({named("IdentifyingNumber", text("id-1"))}));
 }
 
-TEST_F(AgentIdentityTest, LetterCaseOfTheVersionCounts) {
+TEST_F(AgentIdentityTest, TheVersionIsCaseSensitive) {
     const AgentVersion version("4.2.0-Beta");
     EXPECT_TRUE(isTheAgent({named("Version", text("4.2.0-Beta"))}));
     for (const char* other : {"4.2.0-beta", "4.2.0-BETA", "4.2.0-Beta ", "4.2.0"}) {
@@ -153,12 +153,12 @@ TEST_F(AgentIdentityTest, LetterCaseOfTheVersionCounts) {
     }
 }
 
-TEST_F(AgentIdentityTest, LetterCaseOfKeyNamesDoesNotCount) {
+TEST_F(AgentIdentityTest, KeyNamesAreCaseInsensitive) {
     EXPECT_TRUE(isTheAgent({named("VENDOR", text("VEL"))}));
     EXPECT_FALSE(isTheAgent({named("vendor", text("other"))}));
 }
 
-TEST_F(AgentIdentityTest, KeysAreComparedUpToTheFirstThatDoesNotMatch) {
+TEST_F(AgentIdentityTest, KeysAreComparedUpToTheFirstMismatch) {
     isTheAgent(keys());
     EXPECT_THAT(comparedTypes(), ElementsAre("0", "1", "2", "4", "3"));
     isTheAgent(keys({named("ProductName", text("other")), named("Version", text("other"))}));
@@ -167,14 +167,14 @@ TEST_F(AgentIdentityTest, KeysAreComparedUpToTheFirstThatDoesNotMatch) {
     EXPECT_THAT(comparedTypes(), ElementsAre("0", "1", "2", "4", "3"));
 }
 
-TEST_F(AgentIdentityTest, KeysOfOtherNamesAreNotCompared) {
+TEST_F(AgentIdentityTest, KeysWithOtherNamesAreIgnored) {
     EXPECT_TRUE(isTheAgent({named("InstanceID", text("other"))}));
     EXPECT_THAT(comparedTypes(), IsEmpty());
     EXPECT_TRUE(isTheAgent({}));
     EXPECT_THAT(comparedTypes(), IsEmpty());
 }
 
-TEST_F(AgentIdentityTest, KeysThatAreNoTextAreNotCompared) {
+TEST_F(AgentIdentityTest, KeysOfOtherTypesAreIgnored) {
     EXPECT_TRUE(isTheAgent({named("Version", testsupport::uint32(4))}));
     EXPECT_TRUE(isTheAgent({named("Version", testsupport::nullOf(CMPI_string))}));
     EXPECT_THAT(comparedTypes(), IsEmpty());
@@ -186,7 +186,7 @@ TEST_F(AgentIdentityTest, EnumerationPathsAreComparedToo) {
     EXPECT_EQ(provider().enumerateInstanceNames(path({named("Vendor", text("VEL"))})).paths().size(), 1U);
 }
 
-TEST_F(AgentIdentityTest, TheMarkerFileGivesBothNamesTheSuffix) {
+TEST_F(AgentIdentityTest, BothNamesHaveTheSuffixIfTheMarkerFileExists) {
     testsupport::writeFile(marker(), "");
     const auto instances = provider().enumerateInstances(classPath(className)).instances();
     ASSERT_EQ(instances.size(), 1U);
@@ -196,7 +196,7 @@ TEST_F(AgentIdentityTest, TheMarkerFileGivesBothNamesTheSuffix) {
     EXPECT_EQ(textOf(instances[0].path.keys, "ProductName"), "Test Agent Tarvik Agent");
 }
 
-TEST_F(AgentIdentityTest, TheMarkerFileIsLookedForAtEachRequest) {
+TEST_F(AgentIdentityTest, TheMarkerFileIsCheckedInEachRequest) {
     EXPECT_TRUE(isTheAgent({named("Name", text("Test Agent"))}));
     testsupport::writeFile(marker(), "its content does not count");
     EXPECT_FALSE(isTheAgent({named("Name", text("Test Agent"))}));
@@ -219,7 +219,7 @@ TEST_F(AgentIdentityTest, TheAgentCannotBeCreatedModifiedOrDeleted) {
     EXPECT_TRUE(isTheAgent(keys()));
 }
 
-TEST_F(AgentIdentityTest, WhatCannotBeMadeIsPassedOver) {
+TEST_F(AgentIdentityTest, ObjectsThatCannotBeCreatedAreSkipped) {
     for (const char* maker : {"CMPIBrokerEncFT.newObjectPath", "CMPIBrokerEncFT.newInstance"}) {
         broker.failCall(maker, 1, CMPI_RC_ERR_FAILED);
         const Outcome outcome = provider().enumerateInstances(classPath(className));
@@ -233,7 +233,7 @@ TEST_F(AgentIdentityTest, WhatCannotBeMadeIsPassedOver) {
     EXPECT_THAT(loggedFailures(), IsEmpty());
 }
 
-TEST_F(AgentIdentityTest, NoOtherProviderIsAsked) {
+TEST_F(AgentIdentityTest, NoOtherProviderIsCalled) {
     provider().enumerateInstances(classPath(className));
     for (const std::string& function : broker.functions()) {
         EXPECT_NE(function.rfind("CMPIBrokerFT.", 0), 0U) << function;

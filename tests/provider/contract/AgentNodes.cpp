@@ -12,7 +12,7 @@ namespace {
 /** The last line of the configuration before the nodes. */
 const std::string beforeNodes = "discover = false\n";
 
-/** What stands in the configuration before the characters of the version. */
+/** The part of the configuration before the version. */
 const std::string beforeVersion = "\nversion = \"";
 
 std::filesystem::path configuration() {

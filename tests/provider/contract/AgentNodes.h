@@ -5,14 +5,14 @@
 
 namespace contract {
 
-/** Another configuration of the agent than that of the test program, while the object lives. */
+/** Replaces the agent's configuration while it exists. */
 class AgentConfiguration {
 public:
     AgentConfiguration(const AgentConfiguration&) = delete;
     AgentConfiguration& operator=(const AgentConfiguration&) = delete;
 
 protected:
-    /** @param change of the whole configuration, TOML text */
+    /** @param change converts the complete configuration, a TOML document */
     explicit AgentConfiguration(const std::function<std::string(const std::string&)>& change);
     ~AgentConfiguration();
 
@@ -21,16 +21,15 @@ private:
 };
 
 /**
- * Other nodes in the agent's instrumentation tree than those of the test program: TOML text that stands in the
- * agent's configuration while the object lives. The agent reads its configuration when the provider is loaded, so
- * make it before.
+ * Replaces the nodes of the agent's instrumentation tree by a TOML fragment while it exists. The agent reads its
+ * configuration when the provider is loaded, so create the object before.
  */
 class AgentNodes : public AgentConfiguration {
 public:
     explicit AgentNodes(const std::string& nodes);
 };
 
-/** Another version of the agent's product, in the same way. */
+/** Replaces the version of the agent's product while it exists. */
 class AgentVersion : public AgentConfiguration {
 public:
     explicit AgentVersion(const std::string& version);

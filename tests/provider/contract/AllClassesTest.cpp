@@ -8,20 +8,20 @@
 #include <iterator>
 #include <set>
 
-// What holds for every class: its properties are those of its table below and of the MOF, in which the keys have the
-// order of paths and all other properties that of instances, and its operations agree with one another.
+// Properties of every class: the table below matches the MOF, keys have the order of paths and other properties the
+// order of instances, and the operations are consistent with each other.
 
 namespace contract {
 namespace {
 
 using testing::IsEmpty;
 
-/** What a property may be. */
+/** Traits of a property. */
 enum Trait : unsigned {
     plain = 0,
     key = 1,
     writable = 2,
-    never = 4,  ///< known to the class and never set by the provider
+    never = 4,  ///< declared in the class but never set by the provider
 };
 
 struct PropertyRow {
@@ -121,7 +121,7 @@ const std::vector<ClassRow>& classes() {
     return all;
 }
 
-/** Names and types of some rows, as text. */
+/** Returns names and types of some rows as a string. */
 template <class Accepts>
 std::vector<std::string> described(const std::vector<PropertyRow>& rows, Accepts accepts) {
     std::vector<std::string> texts;
@@ -140,7 +140,7 @@ cimhost::Schema readSchema() {
     return read;
 }
 
-/** The classes as the MOF files declare them. */
+/** Returns the classes that the MOF files declare. */
 const cimhost::Schema& schema() {
     static const cimhost::Schema read = readSchema();
     return read;
@@ -151,7 +151,7 @@ bool isWritable(const cimhost::Property& property) {
     return write != nullptr && std::get<bool>(write->value.elements.at(0));
 }
 
-/** A value for a property that no other property has, and that the test's data do not have. */
+/** Returns a unique value for a property that differs from the test data. */
 cimhost::Value otherValue(const PropertyRow& row) {
     const std::string name = row.name;
     switch (row.type) {
@@ -166,7 +166,7 @@ cimhost::Value otherValue(const PropertyRow& row) {
     }
 }
 
-/** What stands for a property when answers are compared over time. */
+/** Returns a property as a string without values that change over time. */
 std::string comparable(const NamedValue& property) {
     return property.name == "LocalDateTime" ? property.name : shown({property}).at(0);
 }
@@ -181,7 +181,7 @@ std::vector<std::string> comparable(const std::vector<Instance>& instances) {
     return texts;
 }
 
-/** Two leases, two warranties, one computer system and full asset data are known. */
+/** A provider with two leases, two warranties, one computer system and complete asset data. */
 class AllClassesTest : public ProviderTest, public testing::WithParamInterface<ClassRow> {
 protected:
     AllClassesTest() {
@@ -265,7 +265,7 @@ TEST_P(AllClassesTest, NamesAndInstancesAreTheSameSet) {
     EXPECT_EQ(std::set<std::string>(texts.begin(), texts.end()).size(), texts.size()) << "a name twice";
 }
 
-TEST_P(AllClassesTest, PathsNameTheClassAndCarryItsKeys) {
+TEST_P(AllClassesTest, PathsHaveTheClassAndItsKeys) {
     const auto keys = described(row().properties, [](const PropertyRow& each) { return (each.traits & key) != 0; });
     for (const ObjectPath& path : names()) {
         EXPECT_EQ(path.className, row().name);
@@ -288,7 +288,7 @@ TEST_P(AllClassesTest, KeyPropertiesAreThePathsKeys) {
     }
 }
 
-TEST_P(AllClassesTest, EachNameIsGotBackUnlessAssociationsWhichCannotBeGot) {
+TEST_P(AllClassesTest, GetReturnsEachEnumeratedNameExceptAssociations) {
     for (const Instance& enumerated : instances()) {
         const Outcome outcome = provider().getInstance(enumerated.path);
         if (!row().canBeGot) {
@@ -300,7 +300,7 @@ TEST_P(AllClassesTest, EachNameIsGotBackUnlessAssociationsWhichCannotBeGot) {
     }
 }
 
-TEST_P(AllClassesTest, EnumerationsAreTheSameTwiceOver) {
+TEST_P(AllClassesTest, RepeatedEnumerationsAreEqual) {
     const auto first = comparable(instances());
     const auto firstNames = textsOf(names());
     EXPECT_EQ(comparable(instances()), first);
@@ -308,7 +308,7 @@ TEST_P(AllClassesTest, EnumerationsAreTheSameTwiceOver) {
     EXPECT_THAT(loggedFailures(), IsEmpty());
 }
 
-TEST_P(AllClassesTest, ModificationChangesTheWritablePropertiesAndNoOther) {
+TEST_P(AllClassesTest, ModificationChangesOnlyTheWritableProperties) {
     const ObjectPath path = names().at(0);
     const bool hasWritable = std::any_of(row().properties.begin(), row().properties.end(),
                                          [](const PropertyRow& each) { return (each.traits & writable) != 0; });
@@ -333,7 +333,7 @@ TEST_P(AllClassesTest, ModificationChangesTheWritablePropertiesAndNoOther) {
     }
 }
 
-TEST_P(AllClassesTest, OtherInstancesStayAsTheyAre) {
+TEST_P(AllClassesTest, OtherInstancesAreUnchanged) {
     const auto before = instances();
     const ObjectPath path = before.at(0).path;
     for (const PropertyRow& each : row().properties) {

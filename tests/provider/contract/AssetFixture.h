@@ -10,34 +10,34 @@ namespace contract {
 constexpr const char* assetClass = "VELKO_AssetIDDetails";
 constexpr const char* assetFile = "asset.dat";
 
-/** The asset identification of the computer, and its file. */
+/** Tests of the computer's asset identification and its file. */
 class AssetTest : public ProviderTest {
 protected:
     static ObjectPath path(std::vector<NamedValue> keys = {});
 
-    /** The keys of the test agent's one computer. */
+    /** Returns the keys of the test agent's computer. */
     static std::vector<NamedValue> keys();
 
-    /** The one instance; fails the test, and is empty, when there is not exactly one. */
+    /** Returns the only instance. Fails the test and returns an empty instance if there is not exactly one. */
     Instance asset();
 
-    /** Its properties as text, "Name=value", without LocalDateTime. */
+    /** Returns its properties as "Name=value", except LocalDateTime. */
     std::vector<std::string> assetTexts();
 
-    /** One property of it as text, "NULL" for null, "(none)" when the instance does not have it. */
+    /** Returns one of its properties as a string: "NULL" for null, "(none)" if it does not exist. */
     std::string property(const std::string& name);
 
-    /** Modifies with these properties; fails the test unless the answer is an empty success. */
+    /** Modifies these properties. Fails the test unless the request succeeds without results. */
     void modify(std::vector<NamedValue> properties);
 
-    /** What the file has for a key; "(none)" without a line for it. */
+    /** Returns the value of a key in the file, or "(none)". */
     static std::string stored(const std::string& key);
 
-    /** The keys of the file's lines, in order. */
+    /** Returns the keys of the file's lines, in order. */
     static std::vector<std::string> storedKeys();
 };
 
-/** One property of an instance as text, "(none)" when it is not there. */
+/** Returns a property of an instance as a string, or "(none)". */
 std::string shownProperty(const Instance& instance, const std::string& name);
 
 }  // namespace contract

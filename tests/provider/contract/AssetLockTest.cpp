@@ -4,8 +4,8 @@
 
 #include <functional>
 
-// No lock is held while the provider calls the object manager: another request may come out of such a call, and it
-// needs the asset file too.
+// The provider holds no lock while it calls the object manager: such a call may make another request that needs the
+// asset file.
 
 namespace contract {
 namespace {
@@ -14,7 +14,7 @@ using testing::SizeIs;
 using testsupport::named;
 using testsupport::text;
 
-/** Functions of the object manager that run something else first. One such object at a time. */
+/** Functions of the object manager that run an action first. Only one instance may exist. */
 class Interruption {
 public:
     Interruption(const CMPIBroker& original, std::function<void()> itsBody)
@@ -28,10 +28,10 @@ public:
     Interruption(const Interruption&) = delete;
     Interruption& operator=(const Interruption&) = delete;
 
-    /** A broker whose makers are interrupted. */
+    /** Returns a broker whose creating functions run the action. */
     const CMPIBroker* broker() const { return &brokerHandle; }
 
-    /** A result whose functions are interrupted. */
+    /** Returns a result whose functions run the action. */
     const CMPIResult* result(const CMPIResult* original) {
         originalResult = original;
         resultTable = *original->ft;
@@ -45,7 +45,7 @@ public:
     int count = 0;
 
 private:
-    /** Not inside itself: what it runs calls the same functions. */
+    /** Runs the action unless it is already running, since the action calls the same functions. */
     void interrupt() {
         if (!isRunning) {
             isRunning = true;
@@ -90,7 +90,9 @@ private:
 
 class AssetLockTest : public AssetTest {
 protected:
-    /** A request for the asset data that fails if the file's lock is held: the mutex tells of a second lock. */
+    /**
+     * Makes requests for the asset data, which fail if this thread holds the lock: the mutex detects recursive locking.
+     */
     void readAndWrite() {
         const Outcome outcome = provider().enumerateInstances(path());
         EXPECT_THAT(outcome, isOk(1));
@@ -102,7 +104,7 @@ protected:
     }
 };
 
-TEST_F(AssetLockTest, AnotherRequestMayComeOutOfTheResultsFunctions) {
+TEST_F(AssetLockTest, ResultFunctionsMayMakeAnotherRequest) {
     writeData(assetFile, "USER.AssetNumber=A-1\n");
     Interruption interruption(*broker.handle(), [this] { readAndWrite(); });
     CMPIInstanceMI* interface = provider().instanceMI();
@@ -120,7 +122,7 @@ TEST_F(AssetLockTest, AnotherRequestMayComeOutOfTheResultsFunctions) {
     EXPECT_EQ(interruption.count, 4);
 }
 
-TEST_F(AssetLockTest, AnotherRequestMayComeOutOfTheBrokersFunctions) {
+TEST_F(AssetLockTest, BrokerFunctionsMayMakeAnotherRequest) {
     writeData(assetFile, "USER.AssetNumber=A-1\n");
     Interruption interruption(*broker.handle(), [this] { readAndWrite(); });
     CMPIStatus status{CMPI_RC_OK, nullptr};
@@ -131,7 +133,7 @@ TEST_F(AssetLockTest, AnotherRequestMayComeOutOfTheBrokersFunctions) {
     EXPECT_EQ(interruption.count, 2);
 }
 
-TEST_F(AssetLockTest, TheLockIsGivenBackAfterEveryFailure) {
+TEST_F(AssetLockTest, TheLockIsReleasedAfterEveryFailure) {
     blockData(assetFile);
     provider().enumerateInstances(path());
     provider().modifyInstance(path(), clientInstance(path(), {}));

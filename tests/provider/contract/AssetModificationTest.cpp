@@ -22,7 +22,7 @@ constexpr const char* writingFailed = "Throwing Exception while writing Data";
 
 class AssetModificationTest : public AssetTest {
 protected:
-    /** Labels and texts of the five pairs, as they are in the file. */
+    /** Returns labels and data of the five pairs in the file. */
     static std::vector<std::string> storedPairs() {
         std::vector<std::string> pairs;
         for (const char* number : {"1", "2", "3", "4", "5"}) {
@@ -37,7 +37,7 @@ protected:
     }
 };
 
-TEST_F(AssetModificationTest, EachWritablePropertyIsStoredUnderItsKey) {
+TEST_F(AssetModificationTest, EachWritablePropertyIsStoredWithItsKey) {
     modify({named("AssetNumber", text("A-2")), named("PrimaryOwnerName", text("Bob")),
             named("PrimaryOwnerPhone", text("12")), named("PrimaryOwnerPosition", text("Clerk")),
             named("PrimaryOwnerDepartment", text("Law")),
@@ -67,7 +67,7 @@ TEST_F(AssetModificationTest, EveryKeyIsWrittenInOrder) {
                             "USER.PersonalizedData4", "USER.PersonalizedLabel5", "USER.PersonalizedData5"));
 }
 
-TEST_F(AssetModificationTest, TheNextRequestAndTheNextProcessSeeIt) {
+TEST_F(AssetModificationTest, ItIsVisibleToTheNextRequestAndTheNextProcess) {
     const std::vector<NamedValue> changes{named("AssetNumber", text("A-2")),
                                           named("PrimaryOwnerName", text("Bob")),
                                           named("LastInventoried", dateTime("20260102030405.000000+060")),
@@ -86,7 +86,7 @@ TEST_F(AssetModificationTest, TheNextRequestAndTheNextProcessSeeIt) {
     EXPECT_EQ(assetTexts(), after);
 }
 
-TEST_F(AssetModificationTest, TextsOfAnyKindComeBackUnchanged) {
+TEST_F(AssetModificationTest, AnyStringIsReadBackUnchanged) {
     for (const char* value : {"", " ", " ends ", "a=b", "#5", "back\\slash", "two\nlines", "tab\t", "\xC3\xA9t\xC3\xA9",
                               "under_score", "*", "Null"}) {
         modify({named("PrimaryOwnerName", text(value))});
@@ -107,7 +107,7 @@ TEST_F(AssetModificationTest, PropertiesThatAreNotSentKeepTheirValues) {
     EXPECT_EQ(stored("USER.LastInventoried"), "20250102030405.000000+060");
 }
 
-TEST_F(AssetModificationTest, TheTagCannotBeChangedAndIsKept) {
+TEST_F(AssetModificationTest, TheTagIsReadOnly) {
     writeData(assetFile, "USER.AssetIdTag=T-9\n");
     modify({named("AssetIdTag", text("T-10")), named("AssetNumber", text("A-2"))});
     EXPECT_EQ(stored("USER.AssetIdTag"), "T-9");
@@ -127,7 +127,7 @@ TEST_F(AssetModificationTest, ReadOnlyPropertiesAreIgnored) {
     EXPECT_EQ(assetTexts(), before);
 }
 
-TEST_F(AssetModificationTest, KeysThatAreNotTheProvidersStayInTheFile) {
+TEST_F(AssetModificationTest, UnknownKeysStayInTheFile) {
     writeData(assetFile, "# inventory\nOTHER.Key=kept\nUSER.AssetNumber=A-1\n\nno assignment\nUSER.Other=kept too\n");
     modify({named("AssetNumber", text("A-2"))});
     EXPECT_THAT(*readData(assetFile), testing::StartsWith("# inventory\nOTHER.Key=kept\nUSER.AssetNumber=A-2\n\n"
@@ -147,7 +147,7 @@ TEST_F(AssetModificationTest, AllFivePairsAreStored) {
     }
 }
 
-TEST_F(AssetModificationTest, APairThatIsNotSentRepeatsTheOneBeforeIt) {
+TEST_F(AssetModificationTest, AnOmittedPairRepeatsThePrecedingOne) {
     modify({named("PersonalizedLabel2", text("Room"))});
     EXPECT_THAT(storedPairs(), ElementsAre("|", "Room|", "Room|", "Room|", "Room|"));
     EXPECT_EQ(property("PersonalizedLabel1"), "\"Null\"");
@@ -156,31 +156,31 @@ TEST_F(AssetModificationTest, APairThatIsNotSentRepeatsTheOneBeforeIt) {
     EXPECT_EQ(property("PersonalizedLabel5"), "\"Room\"");
 }
 
-TEST_F(AssetModificationTest, LabelsAndTextsRepeatEachForItself) {
+TEST_F(AssetModificationTest, LabelsAndDataRepeatIndependently) {
     modify({named("PersonalizedLabel1", text("L1")), named("PersonalizedData1", text("D1")),
             named("PersonalizedData3", text("D3")), named("PersonalizedLabel4", text("L4")),
             named("PersonalizedData4", testsupport::nullOf(CMPI_string))});
     EXPECT_THAT(storedPairs(), ElementsAre("L1|D1", "L1|D1", "L1|D3", "L4|D3", "L4|D3"));
 }
 
-TEST_F(AssetModificationTest, PairsAreEmptiedByAModificationThatSendsNone) {
+TEST_F(AssetModificationTest, AModificationWithoutPairsClearsThem) {
     writeData(assetFile, "USER.PersonalizedLabel1=L1\nUSER.PersonalizedData1=D1\nUSER.PersonalizedLabel5=L5\n");
     modify({named("AssetNumber", text("A-2"))});
     EXPECT_THAT(storedPairs(), Each("|"));
     EXPECT_EQ(property("PersonalizedLabel1"), "\"Null\"");
 }
 
-TEST_F(AssetModificationTest, AnEmptiedTextRepeatsAsEmpty) {
+TEST_F(AssetModificationTest, AnEmptyValueIsRepeatedAsEmpty) {
     modify({named("PersonalizedLabel1", text("L1")), named("PersonalizedLabel2", text(""))});
     EXPECT_THAT(storedPairs(), ElementsAre("L1|", "|", "|", "|", "|"));
 }
 
-TEST_F(AssetModificationTest, ADateMayComeAsText) {
+TEST_F(AssetModificationTest, ADateMayBeSentAsAString) {
     modify({named("LastInventoried", text("20260102030405.000000+060"))});
     EXPECT_EQ(property("LastInventoried"), "\"20260102030405.000000+060\"");
 }
 
-TEST_F(AssetModificationTest, ADateThatIsNoneClearsTheDate) {
+TEST_F(AssetModificationTest, AnInvalidDateClearsTheDate) {
     writeData(assetFile,
               "USER.LastInventoried=20250102030405.000000+060\nUSER.PurchaseDate=20240101000000.000000+000\n");
     modify({named("LastInventoried", text("some day")), named("PurchaseDate", text("00000000000000.000000-000"))});
@@ -188,7 +188,7 @@ TEST_F(AssetModificationTest, ADateThatIsNoneClearsTheDate) {
     EXPECT_EQ(property("PurchaseDate"), "NULL");
 }
 
-TEST_F(AssetModificationTest, APropertyOfAnotherTypeIsPassedOver) {
+TEST_F(AssetModificationTest, APropertyOfAnotherTypeIsIgnored) {
     writeData(assetFile, "USER.AssetNumber=A-1\nUSER.Name=Ann\n");
     modify({named("AssetNumber", testsupport::uint32(7)), named("PrimaryOwnerName", testsupport::boolean(true))});
     EXPECT_EQ(stored("USER.AssetNumber"), "A-1");
@@ -218,13 +218,13 @@ TEST_F(AssetModificationTest, ANullInstanceWritesNothing) {
     EXPECT_THAT(loggedFailures(), IsEmpty());
 }
 
-TEST_F(AssetModificationTest, APathThatSelectsNothingWritesAllTheSame) {
+TEST_F(AssetModificationTest, APathThatSelectsNothingStillWrites) {
     const ObjectPath other = path({named("Version", text("other"))});
     EXPECT_THAT(provider().modifyInstance(other, clientInstance(other, {named("AssetNumber", text("A-2"))})), isOk(0));
     EXPECT_EQ(stored("USER.AssetNumber"), "A-2");
 }
 
-TEST_F(AssetModificationTest, AFileThatCouldNotBeReadIsWrittenWithWhatWasSentAndEmptyTexts) {
+TEST_F(AssetModificationTest, AnUnreadableFileIsRewrittenWithTheSentValuesAndEmptyStrings) {
     blockData(assetFile);
     CMPIInstanceMI* interface = provider().instanceMI();
     static CMPIData (*original)(const CMPIInstance*, const char*, CMPIStatus*);
@@ -234,7 +234,7 @@ TEST_F(AssetModificationTest, AFileThatCouldNotBeReadIsWrittenWithWhatWasSentAnd
                                           named("PurchaseDate", dateTime("20250101000000.000000-300"))})));
         original = altered.table.getProperty;
         altered.table.getProperty = [](const CMPIInstance* instance, const char* name, CMPIStatus* status) {
-            freeData(assetFile);  // what could not be read when the request began can be written now
+            freeData(assetFile);  // the file was unreadable when the request started, and is writable now
             return original(instance, name, status);
         };
         return interface->ft->modifyInstance(interface, context, result, scope.objectPath(path(keys())),
@@ -251,7 +251,7 @@ TEST_F(AssetModificationTest, AFileThatCouldNotBeReadIsWrittenWithWhatWasSentAnd
     EXPECT_FALSE(isLogged(writingFailed));
 }
 
-TEST_F(AssetModificationTest, AFileThatCannotBeOpenedIsOnlyLogged) {
+TEST_F(AssetModificationTest, AFailureToOpenTheFileIsOnlyLogged) {
     blockData(assetFile);
     modify({named("AssetNumber", text("A-2"))});
     EXPECT_TRUE(isLogged(writingFailed));
@@ -261,7 +261,7 @@ TEST_F(AssetModificationTest, AFileThatCannotBeOpenedIsOnlyLogged) {
 }
 
 TEST_F(AssetModificationTest, AFileThatCanBeReadButNotReplacedKeepsItsContent) {
-    // A file of the kernel's: it opens for writing, but nothing can be created beside it to take its place.
+    // A file in procfs can be opened for writing, but no temporary file can be created in its directory.
     fs::create_symlink("/proc/self/oom_score_adj", dataFile(assetFile));
     ASSERT_EQ(property("AssetNumber"), "\"\"");
     modify({named("AssetNumber", text("A-2"))});
@@ -270,7 +270,7 @@ TEST_F(AssetModificationTest, AFileThatCanBeReadButNotReplacedKeepsItsContent) {
     EXPECT_EQ(property("AssetNumber"), "\"\"");
 }
 
-TEST_F(AssetModificationTest, AfterAFailureTheNextOneIsWritten) {
+TEST_F(AssetModificationTest, TheNextModificationAfterAFailureIsWritten) {
     blockData(assetFile);
     modify({named("AssetNumber", text("A-2"))});
     freeData(assetFile);
@@ -278,7 +278,7 @@ TEST_F(AssetModificationTest, AfterAFailureTheNextOneIsWritten) {
     EXPECT_EQ(stored("USER.AssetNumber"), "A-3");
 }
 
-TEST_F(AssetModificationTest, NothingIsLeftBesideTheFile) {
+TEST_F(AssetModificationTest, NoTemporaryFileRemains) {
     modify({named("AssetNumber", text("A-2"))});
     std::vector<std::string> files;
     for (const auto& entry : fs::directory_iterator(agentEnvironment::dataDirectory())) {

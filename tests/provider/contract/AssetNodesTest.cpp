@@ -3,7 +3,7 @@
 
 #include <memory>
 
-// The asset identification on agents whose instrumentation tree lacks something, or has more than one computer.
+// The asset identification with missing nodes or properties, and with more than one computer.
 
 namespace contract {
 namespace {
@@ -13,7 +13,7 @@ using testsupport::named;
 using testsupport::text;
 using testsupport::textOf;
 
-/** One node of the tree, as configuration. */
+/** Returns a node of the tree in the configuration's format. */
 std::string node(int type, const std::string& path, const std::string& properties) {
     return "[[instrumentation.node]]\ntype = " + std::to_string(type) + "\npath = \"" + path + "\"\nproperties = { " +
            properties + " }\n";
@@ -29,14 +29,14 @@ std::string computer(const std::string& properties) {
 
 class AssetNodesTest : public AssetTest {
 protected:
-    /** Gives the agent this tree. */
+    /** Sets the agent's instrumentation tree. */
     void haveNodes(const std::string& toml) {
         unload();
         nodes.reset();
         nodes = std::make_unique<AgentNodes>(toml);
     }
 
-    /** The product name that is shown of a computer whose product is this. */
+    /** Returns the property ProductName of a computer with this product. */
     std::string productNameOf(const std::string& product) {
         haveNodes(system() + computer("\"108\" = \"testhost\", \"39\" = \"" + product + "\""));
         return property("ProductName");
@@ -52,7 +52,7 @@ private:
     std::unique_ptr<AgentNodes> nodes;
 };
 
-TEST_F(AssetNodesTest, TheProductNameEndsBeforeTheBlankBeforeTheFirstDash) {
+TEST_F(AssetNodesTest, TheProductNameEndsOneCharacterBeforeTheFirstDash) {
     EXPECT_EQ(productNameOf("Model X - Tower"), "\"Model X\"");
     EXPECT_EQ(productNameOf("Model X - Tower - Large"), "\"Model X\"");
     EXPECT_EQ(productNameOf("Model-X"), "\"Mode\"");
@@ -60,29 +60,29 @@ TEST_F(AssetNodesTest, TheProductNameEndsBeforeTheBlankBeforeTheFirstDash) {
     EXPECT_EQ(productNameOf("Model X -"), "\"Model X\"");
 }
 
-TEST_F(AssetNodesTest, AProductNameThatBeginsWithADashIsWhole) {
+TEST_F(AssetNodesTest, AProductNameWithALeadingDashIsUnchanged) {
     EXPECT_EQ(productNameOf("- Tower"), "\"- Tower\"");
     EXPECT_EQ(productNameOf("-"), "\"-\"");
 }
 
-TEST_F(AssetNodesTest, AProductNameWithoutDashShowsTheTextBeforeIt) {
+TEST_F(AssetNodesTest, AProductNameWithoutADashRepeatsThePrecedingString) {
     writeData(assetFile, "USER.AssetNumber=A-1\nUSER.AssetIdTag=T-9\n");
     EXPECT_EQ(productNameOf("Model X"), "\"T-9\"");
     EXPECT_EQ(productNameOf(""), "\"T-9\"");
 }
 
-TEST_F(AssetNodesTest, AProductNameWithoutDashShowsTheComputersNameWhenTheFileCannotBeRead) {
+TEST_F(AssetNodesTest, AProductNameWithoutADashIsTheComputersNameIfTheFileCannotBeRead) {
     blockData(assetFile);
     EXPECT_EQ(productNameOf("Model X"), "\"testhost\"");
 }
 
-TEST_F(AssetNodesTest, AComputerWithoutProductHasNoProductName) {
+TEST_F(AssetNodesTest, AComputerWithoutAProductHasNoProductName) {
     haveNodes(system() + computer("\"108\" = \"testhost\""));
     EXPECT_EQ(property("ProductName"), "(none)");
     EXPECT_EQ(asset().properties.size(), 32U);
 }
 
-TEST_F(AssetNodesTest, AComputerWithoutProductAndWithoutAFileThatCanBeReadHasTheRest) {
+TEST_F(AssetNodesTest, AComputerWithoutAProductHasTheOtherPropertiesIfTheFileCannotBeRead) {
     blockData(assetFile);
     haveNodes(system() + computer("\"108\" = \"testhost\""));
     EXPECT_THAT(testsupport::namesOf(asset().properties),
@@ -94,7 +94,7 @@ TEST_F(AssetNodesTest, AComputerWithoutProductAndWithoutAFileThatCanBeReadHasThe
                             "Description=\"Asset ID Information\"", "CSName=\"testhost\"", "AssetIDStringArea=1024"));
 }
 
-TEST_F(AssetNodesTest, AComputerWithoutNameShowsTheTextsBefore) {
+TEST_F(AssetNodesTest, AComputerWithoutANameRepeatsThePrecedingStrings) {
     haveNodes(system() + computer("\"39\" = \"Model X - Tower\""));
     const Instance instance = asset();
     EXPECT_EQ(shownProperty(instance, "Name"), "\"/system\"") << "the identifying number";
@@ -103,19 +103,19 @@ TEST_F(AssetNodesTest, AComputerWithoutNameShowsTheTextsBefore) {
     EXPECT_EQ(shownProperty(instance, "ProductName"), "\"Model X\"");
 }
 
-TEST_F(AssetNodesTest, ASystemWithoutVendorShowsTheTextBefore) {
+TEST_F(AssetNodesTest, ASystemWithoutAVendorRepeatsThePrecedingString) {
     haveNodes(system("\"108\" = \"testhost\"") + computer("\"36\" = \"not asked\", \"108\" = \"alpha\""));
     EXPECT_EQ(property("Vendor"), "\"alpha\"") << "the name";
 }
 
-TEST_F(AssetNodesTest, NeitherNameNorVendorShowTheTextBeforeBoth) {
+TEST_F(AssetNodesTest, WithoutNameAndVendorBothRepeatThePrecedingString) {
     haveNodes(system("\"108\" = \"testhost\"") + computer("\"39\" = \"Model X - Tower\""));
     const Instance instance = asset();
     EXPECT_EQ(shownProperty(instance, "Name"), "\"/system\"");
     EXPECT_EQ(shownProperty(instance, "Vendor"), "\"/system\"");
 }
 
-TEST_F(AssetNodesTest, AKeyThatCannotBeComparedMatchesAnything) {
+TEST_F(AssetNodesTest, AKeyWhosePropertyCannotBeReadMatchesAnyValue) {
     haveNodes(system("\"108\" = \"testhost\"") + computer("\"39\" = \"Model X - Tower\""));
     EXPECT_EQ(countWith({named("Vendor", text("whoever"))}), 1);
     EXPECT_EQ(countWith({named("Name", text("whatever"))}), 1);
@@ -136,7 +136,7 @@ TEST_F(AssetNodesTest, WithoutASystemTheFileIsNotRead) {
     EXPECT_EQ(readData(assetFile), "USER.AssetNumber=A-1\n");
 }
 
-TEST_F(AssetNodesTest, AModificationOfWhatWasNotReadOverwritesTheFile) {
+TEST_F(AssetNodesTest, AModificationWithoutReadingOverwritesTheFile) {
     writeData(assetFile,
               "USER.AssetNumber=A-1\nUSER.AssetIdTag=T-9\nUSER.Name=Ann\nUSER.PersonalizedLabel1=L1\n"
               "USER.PurchaseDate=20240101000000.000000+000\nOTHER.Key=kept\n");
@@ -194,7 +194,7 @@ TEST_F(AssetNodesTest, KeysSelectAmongSeveralComputers) {
     EXPECT_EQ(countWith({named("Name", text("alpha")), named("Version", text("other"))}), 0);
 }
 
-TEST_F(AssetNodesTest, TheIdentifyingNumberIsTheTextOfTheSystemsPlace) {
+TEST_F(AssetNodesTest, TheIdentifyingNumberIsThePathOfTheSystemNode) {
     haveNodes(node(1, "/my system_1", "\"36\" = \"Example Maker\"") + computer("\"108\" = \"testhost\""));
     EXPECT_EQ(property("IdentifyingNumber"), "\"/my%20system%5F1\"");
     EXPECT_EQ(countWith({named("IdentifyingNumber", text("/my%20system%5F1"))}), 1);

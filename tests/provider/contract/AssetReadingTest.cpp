@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <filesystem>
 
-// The asset identification as clients read it.
+// Reading the asset identification.
 
 namespace contract {
 namespace {
@@ -16,7 +16,7 @@ using testsupport::text;
 
 class AssetReadingTest : public AssetTest {};
 
-/** Every key of the file, with a value of its own. */
+/** Every key of the file, each with a unique value. */
 constexpr const char* fullFile =
     "USER.AssetNumber=A-1\nUSER.AssetIdTag=T-9\nUSER.Name=Ann Owner\nUSER.Phone=+49 30 1\nUSER.Position=Head\n"
     "USER.Department=Sales\nUSER.LastInventoried=20250102030405.000000+060\n"
@@ -26,7 +26,7 @@ constexpr const char* fullFile =
     "USER.PersonalizedLabel3=L3\nUSER.PersonalizedData3=D3\nUSER.PersonalizedLabel4=L4\nUSER.PersonalizedData4=D4\n"
     "USER.PersonalizedLabel5=L5\nUSER.PersonalizedData5=D5\n";
 
-TEST_F(AssetReadingTest, EveryValueOfTheFileIsShownInOrder) {
+TEST_F(AssetReadingTest, EveryValueOfTheFileIsReturnedInOrder) {
     writeData(assetFile, fullFile);
     EXPECT_THAT(
         assetTexts(),
@@ -52,7 +52,7 @@ TEST_F(AssetReadingTest, ThePathHasFourKeys) {
     EXPECT_EQ(testsupport::toText(asset().path), testsupport::toText(path(keys())));
 }
 
-TEST_F(AssetReadingTest, WithoutAFileItIsCreatedEmptyAndEverythingIsEmpty) {
+TEST_F(AssetReadingTest, AMissingFileIsCreatedEmptyAndAllValuesAreEmpty) {
     const Instance instance = asset();
     EXPECT_EQ(readData(assetFile), "");
     for (const char* name : {"PrimaryOwnerName", "PrimaryOwnerPhone", "PrimaryOwnerPosition", "PrimaryOwnerDepartment",
@@ -69,19 +69,19 @@ TEST_F(AssetReadingTest, WithoutAFileItIsCreatedEmptyAndEverythingIsEmpty) {
     }
 }
 
-TEST_F(AssetReadingTest, AMissingDirectoryIsNotCreatedAndDoesNoHarm) {
+TEST_F(AssetReadingTest, AMissingDirectoryIsNotCreated) {
     provider();
     fs::remove_all(agentEnvironment::dataDirectory());
     EXPECT_EQ(property("PrimaryOwnerName"), "(none)");
     EXPECT_FALSE(fs::exists(agentEnvironment::dataDirectory()));
 }
 
-TEST_F(AssetReadingTest, TheNamesAloneCreateTheFileToo) {
+TEST_F(AssetReadingTest, EnumerationOfNamesCreatesTheFile) {
     provider().enumerateInstanceNames(path());
     EXPECT_EQ(readData(assetFile), "");
 }
 
-TEST_F(AssetReadingTest, OneLabelAloneStandsAmongPlaceholders) {
+TEST_F(AssetReadingTest, MissingPersonalizedValuesArePlaceholders) {
     writeData(assetFile, "USER.PersonalizedLabel3=Cost centre\n");
     const Instance instance = asset();
     for (const char* number : {"1", "2", "4", "5"}) {
@@ -92,14 +92,14 @@ TEST_F(AssetReadingTest, OneLabelAloneStandsAmongPlaceholders) {
     EXPECT_EQ(shownProperty(instance, "PersonalizedData3"), "\"Null\"");
 }
 
-TEST_F(AssetReadingTest, TheFileIsReadAtEachRequest) {
+TEST_F(AssetReadingTest, TheFileIsReadInEachRequest) {
     writeData(assetFile, "USER.AssetNumber=1\n");
     EXPECT_EQ(property("AssetNumber"), "\"1\"");
     writeData(assetFile, "USER.AssetNumber=2\n");
     EXPECT_EQ(property("AssetNumber"), "\"2\"");
 }
 
-TEST_F(AssetReadingTest, ADateThatIsNoneIsNull) {
+TEST_F(AssetReadingTest, AnInvalidDateIsNull) {
     writeData(assetFile,
               "USER.LastInventoried=yesterday\nUSER.PurchaseDate=00000000000000.000000-000\n"
               "USER.ZOPMUpdateTime=20251301000000.000000+000\n");
@@ -123,13 +123,13 @@ TEST_F(AssetReadingTest, ThePropertyListIsNotApplied) {
     EXPECT_EQ(outcome.instances()[0].properties.size(), 33U);
 }
 
-TEST_F(AssetReadingTest, ItIsGotByAllItsKeys) {
+TEST_F(AssetReadingTest, ItIsReturnedForAllItsKeys) {
     const Outcome outcome = provider().getInstance(path(keys()));
     EXPECT_THAT(outcome, isOk(1));
     EXPECT_EQ(outcome.instances().size(), 1U);
 }
 
-TEST_F(AssetReadingTest, OneWrongKeyIsEnoughToMissIt) {
+TEST_F(AssetReadingTest, ItIsNotReturnedIfOneKeyDiffers) {
     for (std::size_t index = 0; index < keys().size(); ++index) {
         std::vector<NamedValue> wrong = keys();
         for (const char* value : {"other", "", "TESTHOST", "example maker", "4.2.0 "}) {
@@ -142,14 +142,14 @@ TEST_F(AssetReadingTest, OneWrongKeyIsEnoughToMissIt) {
     EXPECT_THAT(loggedFailures(), IsEmpty());
 }
 
-TEST_F(AssetReadingTest, EachKeyAloneIsCompared) {
+TEST_F(AssetReadingTest, EachKeyIsComparedIndividually) {
     for (const NamedValue& key : keys()) {
         EXPECT_EQ(provider().getInstance(path({key})).instances().size(), 1U) << key.name;
         EXPECT_THAT(provider().getInstance(path({named(key.name, text("other"))})).instances(), IsEmpty()) << key.name;
     }
 }
 
-TEST_F(AssetReadingTest, KeysAreTakenInAnOrderOfTheirOwn) {
+TEST_F(AssetReadingTest, KeysAreComparedInAFixedOrder) {
     provider().getInstance(path(keys()));
     std::vector<std::string> types;
     for (const LogRecord& record : logOf()) {
@@ -160,12 +160,12 @@ TEST_F(AssetReadingTest, KeysAreTakenInAnOrderOfTheirOwn) {
     EXPECT_THAT(types, ElementsAre("1", "0", "2", "3"));
 }
 
-TEST_F(AssetReadingTest, LetterCaseOfKeyNamesDoesNotCount) {
+TEST_F(AssetReadingTest, KeyNamesAreCaseInsensitive) {
     EXPECT_EQ(provider().getInstance(path({named("VENDOR", text("Example Maker"))})).instances().size(), 1U);
     EXPECT_THAT(provider().getInstance(path({named("vendor", text("other"))})).instances(), IsEmpty());
 }
 
-TEST_F(AssetReadingTest, KeysOfOtherNamesAndTypesAreNotCompared) {
+TEST_F(AssetReadingTest, KeysWithOtherNamesOrTypesAreIgnored) {
     EXPECT_EQ(provider().getInstance(path({named("Tag", text("other"))})).instances().size(), 1U);
     EXPECT_EQ(provider().getInstance(path({named("Version", testsupport::uint32(4))})).instances().size(), 1U);
     EXPECT_EQ(provider().getInstance(path({named("Name", testsupport::nullOf(CMPI_string))})).instances().size(), 1U);
@@ -178,7 +178,7 @@ TEST_F(AssetReadingTest, EnumerationPathsAreComparedToo) {
     EXPECT_THAT(provider().enumerateInstanceNames(other).paths(), IsEmpty());
 }
 
-TEST_F(AssetReadingTest, AnUnreadableFileLeavesTheComputersOwnProperties) {
+TEST_F(AssetReadingTest, AnUnreadableFileStillReturnsThePropertiesOfTheComputer) {
     blockData(assetFile);
     const Instance instance = asset();
     EXPECT_THAT(testsupport::namesOf(instance.properties),
@@ -209,7 +209,7 @@ TEST_F(AssetReadingTest, AFileThatBecomesReadableIsRead) {
     EXPECT_EQ(property("AssetNumber"), "\"1\"");
 }
 
-TEST_F(AssetReadingTest, WhatCannotBeMadeIsPassedOver) {
+TEST_F(AssetReadingTest, ObjectsThatCannotBeCreatedAreSkipped) {
     for (const char* maker : {"CMPIBrokerEncFT.newObjectPath", "CMPIBrokerEncFT.newInstance"}) {
         broker.failCall(maker, 1, CMPI_RC_ERR_FAILED);
         const Outcome outcome = provider().enumerateInstances(path());

@@ -3,7 +3,7 @@
 #include <optional>
 #include <utility>
 
-// From one end of an association to the other.
+// Associators and AssociatorNames.
 
 namespace contract {
 namespace {
@@ -16,7 +16,7 @@ using testsupport::text;
 
 class AssociationEndsTest : public AssociationTest {
 protected:
-    /** That a request failed inside, with this in the log and nothing in the result. */
+    /** Expects that a request logged this failure and returned nothing. */
     void expectSwallowed(const Outcome& outcome, const char* message) {
         EXPECT_THAT(outcome, isOk(0));
         EXPECT_THAT(outcome.events, IsEmpty());
@@ -28,11 +28,11 @@ protected:
     }
 };
 
-INSTANTIATE_TEST_SUITE_P(Sides, AssociationEndsTest, testing::Values(leases, warranties), sideName);
+INSTANTIATE_TEST_SUITE_P(Kinds, AssociationEndsTest, testing::Values(leases, warranties), associationName);
 
-// From a computer to its records.
+// Associators of computers.
 
-TEST_P(AssociationEndsTest, AComputerLeadsToTheRecordThatBearsTheTextOfItsPlace) {
+TEST_P(AssociationEndsTest, AComputerIsAssociatedWithTheRecordWhoseIdentifierIsItsPath) {
     haveRecords({"A", ofAlpha, ofBeta, "B"});
     for (const auto& [name, identifier] : {std::pair("alpha", ofAlpha), std::pair("beta", ofBeta)}) {
         const Outcome outcome = associatorNames(computerPath(name));
@@ -42,7 +42,7 @@ TEST_P(AssociationEndsTest, AComputerLeadsToTheRecordThatBearsTheTextOfItsPlace)
     EXPECT_EQ(upCalls(), 0) << "computer systems are not asked for";
 }
 
-TEST_P(AssociationEndsTest, AComputerWithoutRecordLeadsNowhere) {
+TEST_P(AssociationEndsTest, AComputerWithoutARecordHasNoAssociators) {
     haveRecords({"A", ofAlpha});
     const Outcome outcome = associatorNames(computerPath("gamma"));
     EXPECT_THAT(outcome, isOk(1));
@@ -50,7 +50,7 @@ TEST_P(AssociationEndsTest, AComputerWithoutRecordLeadsNowhere) {
     EXPECT_THAT(loggedFailures(), IsEmpty());
 }
 
-TEST_P(AssociationEndsTest, AComputerThatTheAgentDoesNotKnowLeadsNowhere) {
+TEST_P(AssociationEndsTest, AnUnknownComputerHasNoAssociators) {
     haveRecords({"A", ofAlpha});
     for (const char* name : {"delta", "ALPHA", "alpha ", ""}) {
         const Outcome outcome = associatorNames(computerPath(name));
@@ -65,11 +65,11 @@ TEST_P(AssociationEndsTest, AssociatorsAreTheSameAsTheInstancesOfTheElementClass
     const Outcome outcome = associators(computerPath("alpha"));
     EXPECT_THAT(outcome, isOk(1));
     EXPECT_EQ(textsOf(outcome.instances()),
-              textsOf(provider().getInstance(keyedPath(side().element, ofAlpha)).instances()));
+              textsOf(provider().getInstance(keyedPath(kind().element, ofAlpha)).instances()));
     EXPECT_EQ(outcome.instances().size(), 1U);
 }
 
-TEST_P(AssociationEndsTest, AComputerWithoutKeysLeadsToEveryRecord) {
+TEST_P(AssociationEndsTest, AComputerPathWithoutKeysIsAssociatedWithEveryRecord) {
     haveRecords({"A", ofAlpha, "B"});
     const Outcome outcome = associatorNames(computerWithKeys({}));
     EXPECT_THAT(outcome, isOk(1));
@@ -78,7 +78,7 @@ TEST_P(AssociationEndsTest, AComputerWithoutKeysLeadsToEveryRecord) {
     EXPECT_THAT(loggedFailures(), IsEmpty());
 }
 
-TEST_P(AssociationEndsTest, TheNameMayStandBehindOtherKeys) {
+TEST_P(AssociationEndsTest, TheNameMayFollowOtherKeys) {
     haveRecords({ofBeta});
     const ObjectPath source =
         computerWithKeys({named("CreationClassName", text("VELKO_ComputerSystem")), named("Name", text("beta"))});
@@ -91,13 +91,13 @@ TEST_P(AssociationEndsTest, KeysWithoutANameFail) {
                     "Could not find 'Name' Key in Moniker");
 }
 
-TEST_P(AssociationEndsTest, TheKeyOfTheNameIsSpelledExactly) {
+TEST_P(AssociationEndsTest, TheNameOfTheKeyIsCaseSensitive) {
     haveRecords({ofAlpha});
     expectSwallowed(associators(computerWithKeys({named("name", text("alpha"))})),
                     "Could not find 'Name' Key in Moniker");
 }
 
-TEST_P(AssociationEndsTest, ANameThatIsNullIsNoName) {
+TEST_P(AssociationEndsTest, ANullNameFails) {
     haveRecords({ofAlpha});
     expectSwallowed(associatorNames(computerWithKeys({named("Name", testsupport::nullOf(CMPI_string))})),
                     "Could not find 'Name' Key in Moniker");
@@ -111,10 +111,10 @@ TEST_P(AssociationEndsTest, ElementPathsAreInTheSourcesNamespace) {
     EXPECT_EQ(outcome.paths()[0].nameSpace, "root/other");
 }
 
-// From a record to computers.
+// Associators of records.
 
-TEST_P(AssociationEndsTest, TheLastComputerSystemIsNeverReached) {
-    const ObjectPath source = keyedPath(side().element, ofAlpha);
+TEST_P(AssociationEndsTest, TheLastComputerSystemIsOmitted) {
+    const ObjectPath source = keyedPath(kind().element, ofAlpha);
     knowComputers({"alpha"});
     EXPECT_THAT(textsOf(associatorNames(source).paths()), IsEmpty());
     EXPECT_THAT(associatorNames(source), isOk(1));
@@ -127,16 +127,16 @@ TEST_P(AssociationEndsTest, TheLastComputerSystemIsNeverReached) {
     EXPECT_THAT(loggedFailures(), IsEmpty());
 }
 
-TEST_P(AssociationEndsTest, ComputerSystemsAreHandedOutAsTheObjectManagerGaveThem) {
+TEST_P(AssociationEndsTest, ComputerSystemsAreReturnedUnchanged) {
     knowComputers({"alpha", "beta", "gamma"});
-    const Outcome outcome = associators(keyedPath(side().element, ofAlpha));
+    const Outcome outcome = associators(keyedPath(kind().element, ofAlpha));
     EXPECT_THAT(outcome, isOk(1));
     EXPECT_EQ(textsOf(outcome.instances()), textsOf({computerSystem("alpha"), computerSystem("beta")}));
 }
 
-TEST_P(AssociationEndsTest, TheRecordsOwnComputerDoesNotNarrowThem) {
+TEST_P(AssociationEndsTest, TheIdentifierDoesNotRestrictTheComputers) {
     knowComputers({"alpha", "beta", "gamma"});
-    EXPECT_THAT(textsOf(associatorNames(keyedPath(side().element, ofGamma)).paths()),
+    EXPECT_THAT(textsOf(associatorNames(keyedPath(kind().element, ofGamma)).paths()),
                 ElementsAre(computer("alpha"), computer("beta")));
     const auto calls = broker.calls("CMPIBrokerFT.enumerateInstances");
     ASSERT_EQ(calls.size(), 1U);
@@ -145,12 +145,12 @@ TEST_P(AssociationEndsTest, TheRecordsOwnComputerDoesNotNarrowThem) {
 
 TEST_P(AssociationEndsTest, TheRecordNeedNotExist) {
     knowComputers({"alpha", "beta"});
-    EXPECT_THAT(textsOf(associatorNames(keyedPath(side().element, ofBeta)).paths()), ElementsAre(computer("alpha")));
+    EXPECT_THAT(textsOf(associatorNames(keyedPath(kind().element, ofBeta)).paths()), ElementsAre(computer("alpha")));
 }
 
-TEST_P(AssociationEndsTest, AnElementWithoutKeysNeedsNoPlaceInTheTree) {
+TEST_P(AssociationEndsTest, AnElementPathWithoutKeysIsAccepted) {
     knowComputers({"alpha", "beta"});
-    const Outcome outcome = associatorNames(classPath(side().element));
+    const Outcome outcome = associatorNames(classPath(kind().element));
     EXPECT_THAT(outcome, isOk(1));
     EXPECT_THAT(textsOf(outcome.paths()), ElementsAre(computer("alpha")));
     EXPECT_THAT(broker.calls("CMPIBrokerFT.enumerateInstances").at(0).arguments,
@@ -159,7 +159,7 @@ TEST_P(AssociationEndsTest, AnElementWithoutKeysNeedsNoPlaceInTheTree) {
 
 TEST_P(AssociationEndsTest, AnElementWithKeysButNoIdentifierFails) {
     knowComputers({"alpha", "beta"});
-    expectSwallowed(associatorNames(objectPath(nameSpace, side().element, {named("instanceid", text(ofAlpha))})),
+    expectSwallowed(associatorNames(objectPath(nameSpace, kind().element, {named("instanceid", text(ofAlpha))})),
                     "Could not find 'InstanceID' Key in Moniker");
     EXPECT_EQ(upCalls(), 0);
 }
@@ -168,7 +168,7 @@ TEST_P(AssociationEndsTest, AnElementWhoseOnlyKeyIsNullFails) {
     haveRecords({ofAlpha});
     knowComputers({"alpha", "beta"});
     const ObjectPath source =
-        objectPath(nameSpace, side().element, {named("InstanceID", testsupport::nullOf(CMPI_string))});
+        objectPath(nameSpace, kind().element, {named("InstanceID", testsupport::nullOf(CMPI_string))});
     for (const Outcome& outcome : {associatorNames(source), associators(source)}) {
         EXPECT_THAT(outcome, isOk(0));
         EXPECT_THAT(outcome.events, IsEmpty());
@@ -178,10 +178,10 @@ TEST_P(AssociationEndsTest, AnElementWhoseOnlyKeyIsNullFails) {
     EXPECT_EQ(upCalls(), 0);
 }
 
-TEST_P(AssociationEndsTest, AnIdentifierThatIsNoPlaceInTheTreeFails) {
+TEST_P(AssociationEndsTest, AnIdentifierThatIsNotANodePathFails) {
     haveRecords({"A"});
     knowComputers({"alpha", "beta"});
-    expectSwallowed(associators(keyedPath(side().element, "A")), "Name Property on computer not available.");
+    expectSwallowed(associators(keyedPath(kind().element, "A")), "Name Property on computer not available.");
     EXPECT_EQ(upCalls(), 0);
 }
 
@@ -197,12 +197,12 @@ TEST_P(AssociationEndsTest, BothDirectionsAreInverse) {
     }
 }
 
-// Sources that are neither end, and the arguments of a request.
+// Associators of other classes, and the arguments of a request.
 
-TEST_P(AssociationEndsTest, AnElementOfTheOtherClassLeadsNowhere) {
+TEST_P(AssociationEndsTest, AnElementOfTheOtherClassHasNoAssociators) {
     haveRecords({ofAlpha});
     knowComputers({"alpha", "beta"});
-    for (const ObjectPath& source : {keyedPath(side().otherElement, ofAlpha), classPath(side().otherElement)}) {
+    for (const ObjectPath& source : {keyedPath(kind().otherElement, ofAlpha), classPath(kind().otherElement)}) {
         const Outcome outcome = associatorNames(source);
         EXPECT_THAT(outcome, isOk(1));
         EXPECT_EQ(outcome.events.size(), 1U);
@@ -211,11 +211,11 @@ TEST_P(AssociationEndsTest, AnElementOfTheOtherClassLeadsNowhere) {
     EXPECT_THAT(loggedFailures(), IsEmpty());
 }
 
-TEST_P(AssociationEndsTest, SourcesOfOtherClassesLeadNowhere) {
+TEST_P(AssociationEndsTest, SourcesOfOtherClassesHaveNoAssociators) {
     haveRecords({ofAlpha});
     knowComputers({"alpha", "beta"});
     for (const char* className :
-         {"VELKO_OstrelAgent", "VELKO_AssetIDDetails", side().associationOfOthers, "CIM_ComputerSystem", ""}) {
+         {"VELKO_OstrelAgent", "VELKO_AssetIDDetails", kind().associationOfOthers, "CIM_ComputerSystem", ""}) {
         const Outcome outcome = associators(objectPath(nameSpace, className, {named("Name", text("alpha"))}));
         EXPECT_THAT(outcome, isOk(1)) << className;
         EXPECT_EQ(outcome.events.size(), 1U) << className;
@@ -223,11 +223,11 @@ TEST_P(AssociationEndsTest, SourcesOfOtherClassesLeadNowhere) {
     EXPECT_EQ(upCalls(), 0);
 }
 
-TEST_P(AssociationEndsTest, AnAssociationAsSourceHasNoFarEnd) {
+TEST_P(AssociationEndsTest, AnAssociationAsSourceHasNoAssociators) {
     haveRecords({"A", "B"});
     knowComputers({"alpha"});
     for (const Outcome& outcome :
-         {associatorNames(classPath(side().association)), associators(classPath(side().association))}) {
+         {associatorNames(classPath(kind().association)), associators(classPath(kind().association))}) {
         EXPECT_THAT(outcome, isOk(1));
         EXPECT_EQ(outcome.events.size(), 1U);
     }
@@ -237,13 +237,13 @@ TEST_P(AssociationEndsTest, ThePropertyListIsNotAppliedAtEitherEnd) {
     haveRecords({ofAlpha});
     knowComputers({"alpha", "beta"});
     const std::vector<std::string> one{"ElementName"};
-    for (const ObjectPath& source : {computerPath("alpha"), keyedPath(side().element, ofAlpha)}) {
+    for (const ObjectPath& source : {computerPath("alpha"), keyedPath(kind().element, ofAlpha)}) {
         EXPECT_EQ(textsOf(associators(source, one).instances()), textsOf(associators(source).instances()));
     }
     EXPECT_EQ(broker.calls("CMPIBrokerFT.enumerateInstances").at(0).arguments.at(1), "null");
 }
 
-TEST_P(AssociationEndsTest, ResultClassAndRolesNarrowNothing) {
+TEST_P(AssociationEndsTest, ResultClassAndRolesAreIgnored) {
     haveRecords({ofAlpha});
     knowComputers({"alpha", "beta"});
     cimhost::AssociationFilter filter = through();
@@ -252,10 +252,10 @@ TEST_P(AssociationEndsTest, ResultClassAndRolesNarrowNothing) {
     filter.resultRole = "Nonsense";
     EXPECT_THAT(textsOf(provider().associatorNames(computerPath("alpha"), filter).paths()),
                 ElementsAre(element(ofAlpha)));
-    EXPECT_EQ(provider().associators(keyedPath(side().element, ofAlpha), filter).instances().size(), 1U);
+    EXPECT_EQ(provider().associators(keyedPath(kind().element, ofAlpha), filter).instances().size(), 1U);
 }
 
-TEST_P(AssociationEndsTest, OnlyTheTwoAssociationClassesAreFollowed) {
+TEST_P(AssociationEndsTest, OnlyTheTwoAssociationClassesAreServed) {
     haveRecords({ofAlpha});
     knowComputers({"alpha", "beta"});
     for (const std::optional<std::string>& className : std::vector<std::optional<std::string>>{
@@ -270,27 +270,27 @@ TEST_P(AssociationEndsTest, OnlyTheTwoAssociationClassesAreFollowed) {
 TEST_P(AssociationEndsTest, ReferencesAreNotSupported) {
     haveRecords({ofAlpha});
     knowComputers({"alpha", "beta"});
-    const cimhost::AssociationFilter filter{{}, side().association, {}, {}};
-    for (const ObjectPath& source : {computerPath("alpha"), keyedPath(side().element, ofAlpha)}) {
+    const cimhost::AssociationFilter filter{{}, kind().association, {}, {}};
+    for (const ObjectPath& source : {computerPath("alpha"), keyedPath(kind().element, ofAlpha)}) {
         EXPECT_THAT(provider().references(source, filter), isRefused(CMPI_RC_ERR_NOT_SUPPORTED));
         EXPECT_THAT(provider().referenceNames(source, filter), isRefused(CMPI_RC_ERR_NOT_SUPPORTED));
     }
     EXPECT_EQ(upCalls(), 0);
 }
 
-TEST_P(AssociationEndsTest, ARecordOfAComputerIsFoundAfterARestart) {
+TEST_P(AssociationEndsTest, AComputersRecordIsFoundAfterARestart) {
     for (const char* identifier : {ofAlpha, ofBeta}) {
-        const ObjectPath path = keyedPath(side().element, identifier);
+        const ObjectPath path = keyedPath(kind().element, identifier);
         ASSERT_THAT(provider().createInstance(path, clientInstance(path, {})), isOk(1));
     }
     unload();
     EXPECT_THAT(textsOf(associatorNames(computerPath("alpha")).paths()), ElementsAre(element(ofAlpha)));
     EXPECT_THAT(textsOf(associatorNames(computerPath("beta")).paths()), ElementsAre(element(ofBeta)));
     knowComputers({"alpha", "beta"});
-    EXPECT_THAT(textsOf(associatorNames(keyedPath(side().element, ofBeta)).paths()), ElementsAre(computer("alpha")));
+    EXPECT_THAT(textsOf(associatorNames(keyedPath(kind().element, ofBeta)).paths()), ElementsAre(computer("alpha")));
 }
 
-/** An agent of whose computers the second has no name, and whose third is named "gamma". */
+/** An agent whose second computer has no name, and whose third is named "gamma". */
 class AssociationNamelessTest : public AssociationTest {
 protected:
     AssociationNamelessTest() : nodes(withoutSecondName) {}
@@ -315,14 +315,14 @@ properties = { "108" = "gamma" }
     AgentNodes nodes;
 };
 
-INSTANTIATE_TEST_SUITE_P(Sides, AssociationNamelessTest, testing::Values(leases, warranties), sideName);
+INSTANTIATE_TEST_SUITE_P(Kinds, AssociationNamelessTest, testing::Values(leases, warranties), associationName);
 
-TEST_P(AssociationNamelessTest, AComputerBeforeTheNamelessOneIsFound) {
+TEST_P(AssociationNamelessTest, AComputerBeforeAnUnnamedOneIsFound) {
     haveRecords({ofAlpha});
     EXPECT_THAT(textsOf(associatorNames(computerPath("alpha")).paths()), ElementsAre(element(ofAlpha)));
 }
 
-TEST_P(AssociationNamelessTest, TheSearchForAComputerBehindTheNamelessOneFails) {
+TEST_P(AssociationNamelessTest, TheSearchForAComputerAfterAnUnnamedOneFails) {
     haveRecords({ofGamma});
     for (const char* name : {"gamma", "delta"}) {
         agentEnvironment::forgetLog();
@@ -333,20 +333,20 @@ TEST_P(AssociationNamelessTest, TheSearchForAComputerBehindTheNamelessOneFails) 
     }
 }
 
-TEST_P(AssociationNamelessTest, ARecordOfTheNamelessComputerFails) {
+TEST_P(AssociationNamelessTest, ARecordOfAnUnnamedComputerFails) {
     knowComputers({"alpha", "beta"});
-    const Outcome outcome = associatorNames(keyedPath(side().element, "/system/nameless"));
+    const Outcome outcome = associatorNames(keyedPath(kind().element, "/system/nameless"));
     EXPECT_THAT(outcome, isOk(0));
     EXPECT_THAT(outcome.events, IsEmpty());
     EXPECT_THAT(caughtFailures(), ElementsAre("Name Property on computer not available."));
 }
 
-TEST_P(AssociationNamelessTest, ARecordOfAComputerBehindTheNamelessOneLeadsToComputers) {
+TEST_P(AssociationNamelessTest, ARecordOfAComputerAfterAnUnnamedOneHasAssociators) {
     knowComputers({"alpha", "gamma"});
-    EXPECT_THAT(textsOf(associatorNames(keyedPath(side().element, ofGamma)).paths()), ElementsAre(computer("alpha")));
+    EXPECT_THAT(textsOf(associatorNames(keyedPath(kind().element, ofGamma)).paths()), ElementsAre(computer("alpha")));
 }
 
-TEST_P(AssociationNamelessTest, AComputerWithoutKeysLeadsToEveryRecordAllTheSame) {
+TEST_P(AssociationNamelessTest, AComputerPathWithoutKeysIsAssociatedWithEveryRecord) {
     haveRecords({"A", "B"});
     EXPECT_THAT(textsOf(associatorNames(classPath("VELKO_ComputerSystem")).paths()),
                 ElementsAre(element("A"), element("B")));

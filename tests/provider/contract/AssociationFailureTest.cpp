@@ -2,7 +2,7 @@
 
 #include <cmpift.h>
 
-// An object manager that fails, call by call, while an association is answered.
+// Failures of each function of the object manager during association requests.
 
 namespace contract {
 namespace {
@@ -12,10 +12,10 @@ using testing::IsEmpty;
 
 constexpr const char* noComputer = "Could not obtain an instance of Computer System";
 
-/** None of them is the one that says yes. */
+/** Values other than 1, which means true. */
 constexpr CMPIBoolean oddAnswers[] = {0, 2, 255};
 
-/** Two computer systems are known, "alpha" and "beta", and the records "A" and "B". */
+/** Two computer systems, "alpha" and "beta", and the records "A" and "B". */
 class AssociationFailureTest : public AssociationTest {
 protected:
     AssociationFailureTest() {
@@ -23,33 +23,33 @@ protected:
         knowComputers({"alpha", "beta"});
     }
 
-    /** That a request ended without results, without an end, and with one failure in the log. */
+    /** Expects that a request returned no results and no done, and logged one failure. */
     void expectSwallowed(const Outcome& outcome, const char* message) {
         EXPECT_THAT(outcome, isOk(0));
         EXPECT_THAT(outcome.events, IsEmpty());
         EXPECT_THAT(caughtFailures(), ElementsAre(message));
     }
 
-    /** The three requests that need a computer system from the object manager. */
+    /** Expects the same of the three requests that need a computer system from the object manager. */
     void expectAllSwallowed(const char* message) {
         expectSwallowed(names(), message);
         agentEnvironment::forgetLog();
         expectSwallowed(instances(), message);
         agentEnvironment::forgetLog();
-        expectSwallowed(associatorNames(keyedPath(side().element, ofAlpha)), message);
+        expectSwallowed(associatorNames(keyedPath(kind().element, ofAlpha)), message);
         agentEnvironment::forgetLog();
-        expectSwallowed(associators(keyedPath(side().element, ofAlpha)), message);
+        expectSwallowed(associators(keyedPath(kind().element, ofAlpha)), message);
     }
 };
 
-INSTANTIATE_TEST_SUITE_P(Sides, AssociationFailureTest, testing::Values(leases, warranties), sideName);
+INSTANTIATE_TEST_SUITE_P(Kinds, AssociationFailureTest, testing::Values(leases, warranties), associationName);
 
 TEST_P(AssociationFailureTest, NoComputerSystemEndsTheRequest) {
     knowComputers({});
     expectAllSwallowed(noComputer);
 }
 
-TEST_P(AssociationFailureTest, AClassOfComputersThatNobodyServesEndsTheRequest) {
+TEST_P(AssociationFailureTest, AnUnservedComputerClassEndsTheRequest) {
     broker.failEnumeration("VELKO_ComputerSystem", CMPI_RC_ERR_INVALID_CLASS);
     expectAllSwallowed(noComputer);
 }
@@ -65,18 +65,18 @@ TEST_P(AssociationFailureTest, ANullEnumerationWithoutAnErrorEndsTheRequest) {
     EXPECT_EQ(broker.count("CMPIEnumerationFT.hasNext"), 0);
 }
 
-TEST_P(AssociationFailureTest, AFailingQuestionForTheFirstElementEndsTheRequest) {
+TEST_P(AssociationFailureTest, AFailureOfHasNextForTheFirstElementEndsTheRequest) {
     broker.failEvery("CMPIEnumerationFT.hasNext", CMPI_RC_ERR_FAILED);
     expectAllSwallowed(noComputer);
     EXPECT_EQ(broker.count("CMPIEnumerationFT.getNext"), 0);
 }
 
-TEST_P(AssociationFailureTest, AFirstElementThatCannotBeHadEndsTheRequest) {
+TEST_P(AssociationFailureTest, AFailureToReadTheFirstElementEndsTheRequest) {
     broker.failEvery("CMPIEnumerationFT.getNext", CMPI_RC_ERR_FAILED);
     expectAllSwallowed(noComputer);
 }
 
-TEST_P(AssociationFailureTest, APathOfTheComputerClassThatCannotBeMadeEndsTheRequest) {
+TEST_P(AssociationFailureTest, AComputerClassPathThatCannotBeCreatedEndsTheRequest) {
     broker.failCall("CMPIBrokerEncFT.newObjectPath", 1, CMPI_RC_ERR_FAILED);
     expectSwallowed(names(), noComputer);
     EXPECT_EQ(upCalls(), 0);
@@ -88,7 +88,7 @@ TEST_P(AssociationFailureTest, ALaterRequestIsNotAffected) {
     EXPECT_THAT(textsOf(names().paths()), ElementsAre(pair("alpha", "A"), pair("alpha", "B")));
 }
 
-TEST_P(AssociationFailureTest, AnAssociationPathThatCannotBeMadeIsPassedOver) {
+TEST_P(AssociationFailureTest, AnAssociationPathThatCannotBeCreatedIsSkipped) {
     broker.failCall("CMPIBrokerEncFT.newObjectPath", 2, CMPI_RC_ERR_FAILED);
     const Outcome outcome = names();
     EXPECT_THAT(outcome, isOk(1));
@@ -96,35 +96,35 @@ TEST_P(AssociationFailureTest, AnAssociationPathThatCannotBeMadeIsPassedOver) {
     EXPECT_THAT(loggedFailures(), IsEmpty());
 }
 
-TEST_P(AssociationFailureTest, ANullAssociationPathWithoutAnErrorIsPassedOver) {
+TEST_P(AssociationFailureTest, ANullAssociationPathWithoutAnErrorIsSkipped) {
     broker.answerNothing("CMPIBrokerEncFT.newObjectPath", 2);
     EXPECT_THAT(textsOf(names().paths()), ElementsAre(pair("alpha", "B")));
 }
 
-TEST_P(AssociationFailureTest, AnElementPathThatCannotBeMadeLeavesThatKeyOut) {
+TEST_P(AssociationFailureTest, AnElementPathThatCannotBeCreatedIsOmittedFromTheKeys) {
     broker.failCall("CMPIBrokerEncFT.newObjectPath", 3, CMPI_RC_ERR_FAILED);
     const std::string withoutDependent = testsupport::toText(association(computerPath("alpha"), {}));
     EXPECT_THAT(textsOf(names().paths()), ElementsAre(withoutDependent, pair("alpha", "B")));
 }
 
-TEST_P(AssociationFailureTest, AComputerThatDoesNotTellItsPathLeavesThatKeyOut) {
+TEST_P(AssociationFailureTest, AComputerPathThatCannotBeReadIsOmittedFromTheKeys) {
     broker.failCall("CMPIInstanceFT.getObjectPath", 1, CMPI_RC_ERR_FAILED);
-    const std::string withoutAntecedent = testsupport::toText(association({}, keyedPath(side().element, "A")));
+    const std::string withoutAntecedent = testsupport::toText(association({}, keyedPath(kind().element, "A")));
     const Outcome outcome = names();
     EXPECT_THAT(outcome, isOk(1));
     EXPECT_THAT(textsOf(outcome.paths()), ElementsAre(withoutAntecedent, pair("alpha", "B")));
 }
 
-TEST_P(AssociationFailureTest, AComputerWithNullAsItsPathLeavesThatKeyOut) {
+TEST_P(AssociationFailureTest, ANullComputerPathIsOmittedFromTheKeys) {
     broker.answerNothing("CMPIInstanceFT.getObjectPath", 1);
-    const std::string withoutAntecedent = testsupport::toText(association({}, keyedPath(side().element, "A")));
+    const std::string withoutAntecedent = testsupport::toText(association({}, keyedPath(kind().element, "A")));
     EXPECT_THAT(textsOf(names().paths()), ElementsAre(withoutAntecedent, pair("alpha", "B")));
 }
 
-TEST_P(AssociationFailureTest, AKeyThatCannotBeAddedIsLeftOut) {
+TEST_P(AssociationFailureTest, AKeyThatCannotBeAddedIsOmitted) {
     broker.failCall("CMPIObjectPathFT.addKey", 1, CMPI_RC_ERR_FAILED);
     EXPECT_THAT(textsOf(names().paths()),
-                ElementsAre(testsupport::toText(association({}, keyedPath(side().element, "A"))), pair("alpha", "B")));
+                ElementsAre(testsupport::toText(association({}, keyedPath(kind().element, "A"))), pair("alpha", "B")));
     broker.failCall("CMPIObjectPathFT.addKey", 2, CMPI_RC_ERR_FAILED);
     EXPECT_THAT(textsOf(names().paths()), ElementsAre(pairWithoutElement("alpha"), pair("alpha", "B")));
     broker.failCall("CMPIObjectPathFT.addKey", 3, CMPI_RC_ERR_FAILED);
@@ -132,7 +132,7 @@ TEST_P(AssociationFailureTest, AKeyThatCannotBeAddedIsLeftOut) {
                 ElementsAre(testsupport::toText(association(computerPath("alpha"), {})), pair("alpha", "B")));
 }
 
-TEST_P(AssociationFailureTest, AnInstanceThatCannotBeMadeIsPassedOver) {
+TEST_P(AssociationFailureTest, AnInstanceThatCannotBeCreatedIsSkipped) {
     broker.failCall("CMPIBrokerEncFT.newInstance", 1, CMPI_RC_ERR_FAILED);
     const Outcome outcome = instances();
     EXPECT_THAT(outcome, isOk(1));
@@ -141,7 +141,7 @@ TEST_P(AssociationFailureTest, AnInstanceThatCannotBeMadeIsPassedOver) {
     EXPECT_THAT(loggedFailures(), IsEmpty());
 }
 
-TEST_P(AssociationFailureTest, AnInstanceWhosePathCannotBeMadeIsPassedOver) {
+TEST_P(AssociationFailureTest, AnInstanceWhosePathCannotBeCreatedIsSkipped) {
     broker.failCall("CMPIBrokerEncFT.newObjectPath", 2, CMPI_RC_ERR_FAILED);
     const Outcome outcome = instances();
     EXPECT_THAT(outcome, isOk(1));
@@ -149,7 +149,7 @@ TEST_P(AssociationFailureTest, AnInstanceWhosePathCannotBeMadeIsPassedOver) {
     EXPECT_EQ(testsupport::toText(outcome.instances()[0].path), pair("alpha", "B"));
 }
 
-TEST_P(AssociationFailureTest, AKeyThatCannotBeReadBecomesNoProperty) {
+TEST_P(AssociationFailureTest, AKeyThatCannotBeReadIsOmittedFromTheProperties) {
     broker.failCall("CMPIObjectPathFT.getKey", 1, CMPI_RC_ERR_FAILED);
     const auto found = instances().instances();
     ASSERT_EQ(found.size(), 2U);
@@ -157,7 +157,7 @@ TEST_P(AssociationFailureTest, AKeyThatCannotBeReadBecomesNoProperty) {
     EXPECT_THAT(testsupport::namesOf(found[1].properties), ElementsAre("Antecedent", "Dependent"));
 }
 
-TEST_P(AssociationFailureTest, APropertyThatCannotBeSetIsLeftOut) {
+TEST_P(AssociationFailureTest, APropertyThatCannotBeSetIsOmitted) {
     broker.failCall("CMPIInstanceFT.setProperty", 2, CMPI_RC_ERR_FAILED);
     const auto found = instances().instances();
     ASSERT_EQ(found.size(), 2U);
@@ -165,7 +165,7 @@ TEST_P(AssociationFailureTest, APropertyThatCannotBeSetIsLeftOut) {
     EXPECT_THAT(testsupport::namesOf(found[1].properties), ElementsAre("Antecedent", "Dependent"));
 }
 
-TEST_P(AssociationFailureTest, AResultThatRefusesAnObjectGetsTheNext) {
+TEST_P(AssociationFailureTest, ObjectsAfterAFailureOfTheResultAreReturned) {
     broker.failCall("CMPIResultFT.returnObjectPath", 1, CMPI_RC_ERR_FAILED);
     const Outcome listed = names();
     EXPECT_THAT(listed, isOk(1));
@@ -176,55 +176,55 @@ TEST_P(AssociationFailureTest, AResultThatRefusesAnObjectGetsTheNext) {
     EXPECT_THAT(names(), isOk(0)) << "the refused end is not reported, nor said again";
 }
 
-TEST_P(AssociationFailureTest, ANamespaceThatCannotBeHadIsEmpty) {
+TEST_P(AssociationFailureTest, ANamespaceThatCannotBeReadIsEmpty) {
     broker.failCall("CMPIObjectPathFT.getNameSpace", 1, CMPI_RC_ERR_FAILED);
     const auto paths = names().paths();
     ASSERT_EQ(paths.size(), 2U);
     EXPECT_EQ(paths[0].nameSpace, "");
 }
 
-TEST_P(AssociationFailureTest, AClassNameThatCannotBeHadIsNoClass) {
+TEST_P(AssociationFailureTest, AClassNameThatCannotBeReadIsNoClass) {
     broker.failCall("CMPIObjectPathFT.getClassName", 1, CMPI_RC_ERR_FAILED);
     EXPECT_THAT(names(), isRefused(CMPI_RC_ERR_INVALID_CLASS));
 }
 
-TEST_P(AssociationFailureTest, ACurrentComputerThatIsLostOnTheWayLeavesItsKeyOut) {
+TEST_P(AssociationFailureTest, AComputerThatCannotBeReadIsOmittedFromTheKeys) {
     knowComputers({"alpha", "beta", "gamma"});
     broker.failCall("CMPIEnumerationFT.getNext", 2, CMPI_RC_ERR_FAILED);
     const Outcome outcome = names();
     EXPECT_THAT(outcome, isOk(1));
-    const std::string lost = testsupport::toText(association({}, classPath(side().element)));
+    const std::string lost = testsupport::toText(association({}, classPath(kind().element)));
     EXPECT_THAT(textsOf(outcome.paths()),
                 ElementsAre(pair("alpha", "A"), pair("alpha", "B"), lost, pairWithoutElement("beta")));
     EXPECT_THAT(loggedFailures(), IsEmpty());
 }
 
-TEST_P(AssociationFailureTest, AFailingQuestionForAFurtherComputerCountsAsNo) {
+TEST_P(AssociationFailureTest, AFailureOfHasNextEndsTheComputers) {
     broker.failCall("CMPIEnumerationFT.hasNext", 2, CMPI_RC_ERR_FAILED);
-    const Outcome outcome = associatorNames(keyedPath(side().element, ofAlpha));
+    const Outcome outcome = associatorNames(keyedPath(kind().element, ofAlpha));
     EXPECT_THAT(outcome, isOk(1));
     EXPECT_THAT(outcome.paths(), IsEmpty());
     EXPECT_THAT(loggedFailures(), IsEmpty());
 }
 
-TEST_P(AssociationFailureTest, AFarEndWithoutPathIsPassedOver) {
+TEST_P(AssociationFailureTest, AnAssociatedObjectWithoutAPathIsSkipped) {
     knowComputers({"alpha", "beta", "gamma"});
     broker.failCall("CMPIInstanceFT.getObjectPath", 1, CMPI_RC_ERR_FAILED);
-    const Outcome outcome = associatorNames(keyedPath(side().element, ofAlpha));
+    const Outcome outcome = associatorNames(keyedPath(kind().element, ofAlpha));
     EXPECT_THAT(outcome, isOk(1));
     EXPECT_THAT(textsOf(outcome.paths()), ElementsAre(computer("beta")));
 }
 
-TEST_P(AssociationFailureTest, AFarEndThatIsLostOnTheWayIsPassedOver) {
+TEST_P(AssociationFailureTest, AnAssociatedObjectThatCannotBeReadIsSkipped) {
     knowComputers({"alpha", "beta", "gamma"});
     broker.failCall("CMPIEnumerationFT.getNext", 2, CMPI_RC_ERR_FAILED);
-    const Outcome outcome = associators(keyedPath(side().element, ofAlpha));
+    const Outcome outcome = associators(keyedPath(kind().element, ofAlpha));
     EXPECT_THAT(outcome, isOk(1));
     EXPECT_THAT(textsOf(outcome.instances()),
                 ElementsAre(textsOf({computerSystem("alpha")})[0], textsOf({computerSystem("beta")})[0]));
 }
 
-TEST_P(AssociationFailureTest, AnElementThatCannotBeMadeIsPassedOver) {
+TEST_P(AssociationFailureTest, AnElementThatCannotBeCreatedIsSkipped) {
     haveRecords({ofAlpha});
     broker.failEvery("CMPIBrokerEncFT.newInstance", CMPI_RC_ERR_FAILED);
     const Outcome outcome = associators(computerPath("alpha"));
@@ -232,14 +232,14 @@ TEST_P(AssociationFailureTest, AnElementThatCannotBeMadeIsPassedOver) {
     EXPECT_THAT(outcome.instances(), IsEmpty());
 }
 
-TEST_P(AssociationFailureTest, ComputersCountWhateverTheStateOfTheElementsThatTheManagerReturns) {
+TEST_P(AssociationFailureTest, TheStateOfEnumerationElementsIsIgnored) {
     for (const int state : {CMPI_goodValue, CMPI_nullValue, CMPI_keyValue, CMPI_notFound, CMPI_badValue}) {
         broker.answerState("CMPIEnumerationFT.getNext", static_cast<CMPIValueState>(state));
         EXPECT_THAT(textsOf(names().paths()), ElementsAre(pair("alpha", "A"), pair("alpha", "B")));
     }
 }
 
-/** An object manager whose enumerations answer any number to the question whether there is more. */
+/** An object manager whose enumerations return any number from hasNext. */
 class OddEnumeration {
 public:
     OddEnumeration(testsupport::RecordingBroker& recording, CMPIBoolean itsAnswer, const std::string& computerName)
@@ -260,7 +260,7 @@ public:
 
     const CMPIBroker* broker() const { return &handle; }
 
-    /** The answer from the second question on. */
+    /** Sets the result from the second call on. */
     void sayLater(CMPIBoolean itsAnswer) { later = itsAnswer; }
 
 private:
@@ -274,7 +274,7 @@ private:
     static CMPIBoolean hasNext(const CMPIEnumeration* self, CMPIStatus* rc) {
         auto& odd = *static_cast<OddEnumeration*>(self->hdl);
         *rc = {CMPI_RC_OK, nullptr};
-        constexpr int mostQuestions = 10;  // lets a provider that takes any answer for yes come to an end
+        constexpr int mostQuestions = 10;  // stops a provider that accepts any result as true
         if (++odd.questions > mostQuestions) {
             return 0;
         }
@@ -301,18 +301,18 @@ private:
     CMPIInstance* computer;
 };
 
-TEST_P(AssociationFailureTest, AnAnswerOtherThanOneToTheFirstQuestionIsNoComputer) {
+TEST_P(AssociationFailureTest, AFirstHasNextOtherThanOneMeansNoComputer) {
     for (const CMPIBoolean answer : oddAnswers) {
         SCOPED_TRACE(int{answer});
         OddEnumeration odd(broker, answer, "alpha");
         CMPIStatus status{CMPI_RC_OK, nullptr};
         provider().createAssociationMI(odd.broker(), &status);
-        expectSwallowed(associatorNames(keyedPath(side().element, ofAlpha)), noComputer);
+        expectSwallowed(associatorNames(keyedPath(kind().element, ofAlpha)), noComputer);
         agentEnvironment::forgetLog();
     }
 }
 
-TEST_P(AssociationFailureTest, OnlyTheAnswerOneIsAFurtherComputer) {
+TEST_P(AssociationFailureTest, OnlyAHasNextOfOneMeansAFurtherComputer) {
     OddEnumeration odd(broker, 1, "alpha");
     CMPIStatus status{CMPI_RC_OK, nullptr};
     provider().createAssociationMI(odd.broker(), &status);
@@ -320,7 +320,7 @@ TEST_P(AssociationFailureTest, OnlyTheAnswerOneIsAFurtherComputer) {
     for (const CMPIBoolean answer : oddAnswers) {
         SCOPED_TRACE(int{answer});
         odd.sayLater(answer);
-        EXPECT_THAT(associatorNames(keyedPath(side().element, ofAlpha)).paths(), IsEmpty());
+        EXPECT_THAT(associatorNames(keyedPath(kind().element, ofAlpha)).paths(), IsEmpty());
         EXPECT_THAT(textsOf(names().paths()), ElementsAre(pair("alpha", "A"), pair("alpha", "B")));
     }
 }

@@ -29,10 +29,10 @@ path = "/system/third"
 properties = { "108" = "gamma" }
 )";
 
-std::string recordFile(const Side& side, const std::vector<std::string>& identifiers) {
+std::string recordFile(const AssociationKind& kind, const std::vector<std::string>& identifiers) {
     std::string content = std::to_string(identifiers.size()) + "\n";
     for (const std::string& identifier : identifiers) {
-        content += identifier + "\n" + side.fields;
+        content += identifier + "\n" + kind.fields;
     }
     return content;
 }
@@ -59,7 +59,7 @@ std::vector<std::string> textsOf(const std::vector<Instance>& instances) {
 }
 
 void AssociationTest::haveRecords(const std::vector<std::string>& identifiers) {
-    writeData(side().dataFile, recordFile(side(), identifiers));
+    writeData(kind().dataFile, recordFile(kind(), identifiers));
 }
 
 void AssociationTest::knowComputers(const std::vector<std::string>& names) {
@@ -73,23 +73,23 @@ std::string AssociationTest::computer(const std::string& name) {
 }
 
 std::string AssociationTest::element(const std::string& identifier) {
-    return testsupport::toText(keyedPath(side().element, identifier));
+    return testsupport::toText(keyedPath(kind().element, identifier));
 }
 
 std::string AssociationTest::keylessElement() {
-    return testsupport::toText(classPath(side().element));
+    return testsupport::toText(classPath(kind().element));
 }
 
 std::string AssociationTest::pair(const std::string& computerName, const std::string& identifier) {
-    return testsupport::toText(association(computerPath(computerName), keyedPath(side().element, identifier)));
+    return testsupport::toText(association(computerPath(computerName), keyedPath(kind().element, identifier)));
 }
 
 std::string AssociationTest::pairWithoutElement(const std::string& computerName) {
-    return testsupport::toText(association(computerPath(computerName), classPath(side().element)));
+    return testsupport::toText(association(computerPath(computerName), classPath(kind().element)));
 }
 
 ObjectPath AssociationTest::association(const ObjectPath& antecedent, const ObjectPath& dependent) {
-    ObjectPath path = classPath(side().association);
+    ObjectPath path = classPath(kind().association);
     if (!antecedent.className.empty()) {
         path.keys.push_back(testsupport::named("Antecedent", testsupport::reference(antecedent)));
     }

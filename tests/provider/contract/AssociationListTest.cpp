@@ -12,7 +12,7 @@ using testing::IsEmpty;
 
 class AssociationListTest : public AssociationTest {};
 
-INSTANTIATE_TEST_SUITE_P(Sides, AssociationListTest, testing::Values(leases, warranties), sideName);
+INSTANTIATE_TEST_SUITE_P(Kinds, AssociationListTest, testing::Values(leases, warranties), associationName);
 
 TEST_P(AssociationListTest, OneComputerIsPairedWithEachRecord) {
     haveRecords({"A", "B", "C"});
@@ -23,18 +23,18 @@ TEST_P(AssociationListTest, OneComputerIsPairedWithEachRecord) {
     EXPECT_EQ(outcome.events.size(), 4U) << "three paths and the end";
 }
 
-TEST_P(AssociationListTest, PathsHaveTheEndsAsTheirTwoKeys) {
+TEST_P(AssociationListTest, PathsHaveBothEndsAsKeys) {
     haveRecords({"A"});
     knowComputers({"alpha"});
     const ObjectPath path = names().paths().at(0);
-    EXPECT_EQ(path.className, side().association);
+    EXPECT_EQ(path.className, kind().association);
     EXPECT_EQ(path.nameSpace, nameSpace);
     EXPECT_THAT(testsupport::namesOf(path.keys), ElementsAre("Antecedent", "Dependent"));
     EXPECT_EQ(path.keys.at(0).value.type, CMPI_ref);
     EXPECT_EQ(path.keys.at(1).value.type, CMPI_ref);
 }
 
-TEST_P(AssociationListTest, InstancesHaveThePathsKeysAsTheirOnlyProperties) {
+TEST_P(AssociationListTest, InstancesHaveOnlyTheKeyProperties) {
     haveRecords({"A", "B"});
     knowComputers({"alpha"});
     const auto paths = names().paths();
@@ -48,7 +48,7 @@ TEST_P(AssociationListTest, InstancesHaveThePathsKeysAsTheirOnlyProperties) {
     }
 }
 
-TEST_P(AssociationListTest, NoRecordAndOneComputerMakeNoPair) {
+TEST_P(AssociationListTest, NoRecordAndOneComputerYieldNoPair) {
     knowComputers({"alpha"});
     const Outcome outcome = names();
     EXPECT_THAT(outcome, isOk(1));
@@ -56,7 +56,7 @@ TEST_P(AssociationListTest, NoRecordAndOneComputerMakeNoPair) {
     EXPECT_THAT(loggedFailures(), IsEmpty());
 }
 
-TEST_P(AssociationListTest, NoRecordAndTwoComputersMakeOnePairWithoutElementKey) {
+TEST_P(AssociationListTest, NoRecordAndTwoComputersYieldOnePairWithoutAnElementKey) {
     knowComputers({"alpha", "beta"});
     EXPECT_THAT(textsOf(names().paths()), ElementsAre(pairWithoutElement("alpha")));
     const Outcome outcome = instances();
@@ -80,12 +80,12 @@ TEST_P(AssociationListTest, AComputerBetweenTheFirstAndTheLastIsPairedWithNoReco
                 ElementsAre(pair("alpha", "A"), pair("alpha", "B"), pairWithoutElement("beta")));
 }
 
-TEST_P(AssociationListTest, NoRecordAndThreeComputersMakeTwoPairsWithoutElementKey) {
+TEST_P(AssociationListTest, NoRecordAndThreeComputersYieldTwoPairsWithoutAnElementKey) {
     knowComputers({"alpha", "beta", "gamma"});
     EXPECT_THAT(textsOf(names().paths()), ElementsAre(pairWithoutElement("alpha"), pairWithoutElement("beta")));
 }
 
-TEST_P(AssociationListTest, ComputersOfTheObjectManagerNeedNotBeTheAgents) {
+TEST_P(AssociationListTest, ComputersNeedNotBeKnownToTheAgent) {
     haveRecords({"A"});
     knowComputers({"unheard of"});
     EXPECT_THAT(textsOf(names().paths()), ElementsAre(pair("unheard of", "A")));
@@ -94,23 +94,23 @@ TEST_P(AssociationListTest, ComputersOfTheObjectManagerNeedNotBeTheAgents) {
 TEST_P(AssociationListTest, DeletedRecordsAreInNoPair) {
     haveRecords({"A", "B", "C"});
     knowComputers({"alpha"});
-    ASSERT_THAT(provider().deleteInstance(keyedPath(side().element, "B")), isOk(0));
+    ASSERT_THAT(provider().deleteInstance(keyedPath(kind().element, "B")), isOk(0));
     EXPECT_THAT(textsOf(names().paths()), ElementsAre(pair("alpha", "A"), pair("alpha", "C")));
 }
 
 TEST_P(AssociationListTest, RecordsOfTheOtherClassAreInNoPair) {
-    const Side& other = std::string(side().element) == leases.element ? warranties : leases;
+    const AssociationKind& other = std::string(kind().element) == leases.element ? warranties : leases;
     writeData(other.dataFile, recordFile(other, {"X"}));
     haveRecords({"A"});
     knowComputers({"alpha"});
     EXPECT_THAT(textsOf(names().paths()), ElementsAre(pair("alpha", "A")));
 }
 
-TEST_P(AssociationListTest, ComputersAreAskedForByClassInTheRequestsNamespace) {
+TEST_P(AssociationListTest, ComputersAreEnumeratedInTheRequestsNamespace) {
     haveRecords({"A"});
     knowComputers({"alpha"});
     const Outcome outcome =
-        provider().enumerateInstanceNames(testsupport::objectPath("root/other", side().association));
+        provider().enumerateInstanceNames(testsupport::objectPath("root/other", kind().association));
     const auto calls = broker.calls("CMPIBrokerFT.enumerateInstances");
     ASSERT_EQ(calls.size(), 1U);
     EXPECT_THAT(calls[0].arguments, ElementsAre("root/other:VELKO_ComputerSystem", "null"));
@@ -121,10 +121,10 @@ TEST_P(AssociationListTest, ComputersAreAskedForByClassInTheRequestsNamespace) {
     EXPECT_EQ(dependent->nameSpace, "root/other");
 }
 
-TEST_P(AssociationListTest, KeysOfTheRequestsPathNarrowNothing) {
+TEST_P(AssociationListTest, KeysOfTheRequestsPathAreIgnored) {
     haveRecords({"A", "B"});
     knowComputers({"alpha"});
-    const ObjectPath keyed = association(computerPath("alpha"), keyedPath(side().element, "B"));
+    const ObjectPath keyed = association(computerPath("alpha"), keyedPath(kind().element, "B"));
     EXPECT_THAT(textsOf(provider().enumerateInstanceNames(keyed).paths()),
                 ElementsAre(pair("alpha", "A"), pair("alpha", "B")));
 }
@@ -134,14 +134,14 @@ TEST_P(AssociationListTest, ThePropertyListIsNotApplied) {
     knowComputers({"alpha"});
     const auto all = textsOf(instances().instances());
     const Outcome narrowed =
-        provider().enumerateInstances(classPath(side().association), std::vector<std::string>{"Dependent"});
+        provider().enumerateInstances(classPath(kind().association), std::vector<std::string>{"Dependent"});
     EXPECT_EQ(textsOf(narrowed.instances()), all);
 }
 
-TEST_P(AssociationListTest, LetterCaseOfTheClassNameDoesNotCount) {
+TEST_P(AssociationListTest, TheClassNameIsCaseInsensitive) {
     haveRecords({"A"});
     knowComputers({"alpha"});
-    std::string lowered = side().association;
+    std::string lowered = kind().association;
     for (char& character : lowered) {
         character = static_cast<char>(std::tolower(static_cast<unsigned char>(character)));
     }
@@ -149,16 +149,16 @@ TEST_P(AssociationListTest, LetterCaseOfTheClassNameDoesNotCount) {
                 ElementsAre(pair("alpha", "A")));
 }
 
-TEST_P(AssociationListTest, NothingIsChangedByIt) {
+TEST_P(AssociationListTest, EnumerationChangesNothing) {
     haveRecords({"A"});
     knowComputers({"alpha"});
-    const auto before = readData(side().dataFile);
+    const auto before = readData(kind().dataFile);
     names();
     instances();
-    EXPECT_EQ(readData(side().dataFile), before);
+    EXPECT_EQ(readData(kind().dataFile), before);
 }
 
-TEST_P(AssociationListTest, AssociationsCannotBeGot) {
+TEST_P(AssociationListTest, GetInstanceIsNotSupported) {
     haveRecords({"A"});
     knowComputers({"alpha"});
     const ObjectPath existing = names().paths().at(0);

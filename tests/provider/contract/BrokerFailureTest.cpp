@@ -3,7 +3,7 @@
 #include <functional>
 #include <map>
 
-// Requests of a broker whose functions fail.
+// Requests with a broker whose functions fail.
 
 namespace contract {
 namespace {
@@ -22,7 +22,7 @@ constexpr CMPIrc brokerCode = CMPI_RC_ERR_ACCESS_DENIED;
 
 class BrokerFailureTest : public RecordTest {
 protected:
-    /** Lets a call fail, or answer nothing at all with the status OK. */
+    /** Lets a call fail, or return null with the status OK. */
     void spoil(const std::string& function, int number, bool isSilent) {
         if (isSilent) {
             broker.answerNothing(function, number);
@@ -32,7 +32,7 @@ protected:
     }
 };
 
-TEST_P(BrokerFailureTest, APathThatCannotBeMadeIsLeftOutOfTheNames) {
+TEST_P(BrokerFailureTest, APathThatCannotBeCreatedIsOmitted) {
     createAll({"A", "B", "C"});
     for (const bool isSilent : {false, true}) {
         spoil(newObjectPath, 2, isSilent);
@@ -43,7 +43,7 @@ TEST_P(BrokerFailureTest, APathThatCannotBeMadeIsLeftOutOfTheNames) {
     }
 }
 
-TEST_P(BrokerFailureTest, NothingIsHandedOverWhenNoPathCanBeMade) {
+TEST_P(BrokerFailureTest, NothingIsReturnedIfNoPathCanBeCreated) {
     createAll({"A", "B", "C"});
     broker.failEvery(newObjectPath, brokerCode);
     broker.forget();
@@ -55,7 +55,7 @@ TEST_P(BrokerFailureTest, NothingIsHandedOverWhenNoPathCanBeMade) {
     EXPECT_EQ(broker.count(newObjectPath), 6) << "each record is tried";
 }
 
-TEST_P(BrokerFailureTest, AnInstanceThatCannotBeMadeIsLeftOut) {
+TEST_P(BrokerFailureTest, AnInstanceThatCannotBeCreatedIsOmitted) {
     createAll({"A", "B", "C"});
     for (const char* maker : {newInstance, newObjectPath}) {
         for (const bool isSilent : {false, true}) {
@@ -72,7 +72,7 @@ TEST_P(BrokerFailureTest, AnInstanceThatCannotBeMadeIsLeftOut) {
     }
 }
 
-TEST_P(BrokerFailureTest, ACreatedRecordStaysAlsoWhenItsInstanceCannotBeMade) {
+TEST_P(BrokerFailureTest, ARecordIsCreatedEvenIfItsInstanceCannotBeCreated) {
     for (const char* maker : {newInstance, newObjectPath}) {
         spoil(maker, 1, false);
         const Outcome outcome = create(maker);
@@ -83,7 +83,7 @@ TEST_P(BrokerFailureTest, ACreatedRecordStaysAlsoWhenItsInstanceCannotBeMade) {
     EXPECT_EQ(data(), dataOfNew({newInstance, newObjectPath}));
 }
 
-TEST_P(BrokerFailureTest, ARecordIsDeletedAlsoWhenItsInstanceCannotBeMade) {
+TEST_P(BrokerFailureTest, ARecordIsDeletedEvenIfItsInstanceCannotBeCreated) {
     createAll({"A", "B"});
     broker.failEvery(newInstance, brokerCode);
     EXPECT_THAT(remove("A"), isOk(0));
@@ -94,7 +94,7 @@ TEST_P(BrokerFailureTest, ARecordIsDeletedAlsoWhenItsInstanceCannotBeMade) {
     EXPECT_THAT(loggedFailures(), IsEmpty());
 }
 
-TEST_P(BrokerFailureTest, APropertyThatCannotBeSetIsLeftOutAndTheOthersAreSet) {
+TEST_P(BrokerFailureTest, APropertyThatCannotBeSetIsOmittedAndTheOthersAreSet) {
     createAll({"A"});
     const std::vector<std::string> all = kind().shownRecord("A");
     for (std::size_t index = 0; index < all.size(); ++index) {
@@ -105,7 +105,7 @@ TEST_P(BrokerFailureTest, APropertyThatCannotBeSetIsLeftOutAndTheOthersAreSet) {
     }
 }
 
-TEST_P(BrokerFailureTest, ADateThatTheBrokerCannotMakeIsNull) {
+TEST_P(BrokerFailureTest, ADateThatTheBrokerCannotCreateIsNull) {
     createAll({"A"});
     modify("A", {named(kind().dateProperty, text("20240506070809.123456+120"))});
     for (const bool isSilent : {false, true}) {
@@ -114,7 +114,7 @@ TEST_P(BrokerFailureTest, ADateThatTheBrokerCannotMakeIsNull) {
     }
 }
 
-TEST_P(BrokerFailureTest, AKeyThatCannotBeReadSelectsNothingAndSoDeletionIsRefused) {
+TEST_P(BrokerFailureTest, AKeyThatCannotBeReadSelectsNothingSoDeletionFails) {
     createAll({"A", "B"});
     broker.failEvery("CMPIObjectPathFT.getKey", CMPI_RC_ERR_NOT_FOUND);
     EXPECT_THAT(identifiersOf(get("B").instances()), ElementsAre("A", "B"));
@@ -130,7 +130,7 @@ TEST_P(BrokerFailureTest, AKeyCountThatCannotBeReadMeansNoKey) {
     EXPECT_THAT(identifiersOf(get("B").instances()), ElementsAre("A", "B"));
 }
 
-TEST_P(BrokerFailureTest, AnEndThatTheResultRefusesIsNotHeeded) {
+TEST_P(BrokerFailureTest, AFailureOfReturnDoneIsIgnored) {
     createAll({"A"});
     broker.failEvery("CMPIResultFT.returnDone", CMPI_RC_ERR_FAILED);
     EXPECT_THAT(get("missing"), isOk(0));
@@ -141,12 +141,12 @@ TEST_P(BrokerFailureTest, AnEndThatTheResultRefusesIsNotHeeded) {
 
 INSTANTIATE_RECORD_TEST(BrokerFailureTest);
 
-/** Every call that a request makes fails in turn, in two ways; whatever comes of it, table and file agree. */
+/** Each call that a request makes fails, in two ways. Table and file stay consistent. */
 class EveryCallFailsTest : public RecordTest {
 protected:
     using Request = std::function<Outcome()>;
 
-    /** What the request answers when the call at an index fails. */
+    /** Returns the expected code of the request when the call at an index fails. */
     using ExpectedCode = std::function<CMPIrc(std::size_t index, bool isSilent)>;
 
     EveryCallFailsTest() { broker.serve("VELKO_ComputerSystem", {computer("one"), computer("two")}); }
@@ -154,9 +154,9 @@ protected:
     static Instance computer(const char* name) { return clientInstance(computerPath(name), {}); }
 
     /**
-     * @param expected code for the failing call
-     * @param mostDone how often it may at most say that it is done
-     * @param after what is looked at, and put back, after each request
+     * @param expected code of the request for the failing call
+     * @param mostDone maximum number of calls of returnDone
+     * @param after called after each request, to check and restore the state
      */
     void failInTurn(const Request& request, const ExpectedCode& expected, const std::function<void()>& after,
                     int mostDone = 1) {
@@ -194,32 +194,32 @@ protected:
     /** For operations that take the class from the path: the first two calls read it. */
     static CMPIrc byClass(std::size_t index, bool) { return index < 2 ? CMPI_RC_ERR_INVALID_CLASS : CMPI_RC_OK; }
 
-    /** For creation: the two calls after these read the namespace, and their code is the answer. */
+    /** For creation: the next two calls read the namespace, and the request returns their code. */
     static CMPIrc byClassAndNamespace(std::size_t index, bool isSilent) {
         return index == 2 || index == 3 ? (isSilent ? CMPI_RC_OK : brokerCode) : byClass(index, isSilent);
     }
 
     static CMPIrc always(std::size_t, bool) { return CMPI_RC_OK; }
 
-    /** That the records are these, and all new ones, in memory and in the file. */
+    /** Expects that memory and file contain exactly these new records. */
     void expectRecords(const std::vector<std::string>& expected) {
         EXPECT_EQ(identifiers(), expected);
         EXPECT_EQ(data(), dataOfNew(expected));
     }
 
-    /** The same after the library has been loaded again. */
+    /** Expects the same after the library is loaded again. */
     void expectRecordsAfterReload(const std::vector<std::string>& expected) {
         unload();
         expectRecords(expected);
     }
 };
 
-TEST_P(EveryCallFailsTest, WhileInstancesAreEnumerated) {
+TEST_P(EveryCallFailsTest, DuringEnumerateInstances) {
     createAll({"A", "B"});
     failInTurn([&] { return provider().enumerateInstances(allPath()); }, byClass, [&] { expectRecords({"A", "B"}); });
 }
 
-TEST_P(EveryCallFailsTest, WhileNamesAreEnumerated) {
+TEST_P(EveryCallFailsTest, DuringEnumerateInstanceNames) {
     createAll({"A", "B"});
     failInTurn([&] { return provider().enumerateInstanceNames(allPath()); }, byClass,
                [&] {
@@ -227,12 +227,12 @@ TEST_P(EveryCallFailsTest, WhileNamesAreEnumerated) {
                });
 }
 
-TEST_P(EveryCallFailsTest, WhileOneIsGot) {
+TEST_P(EveryCallFailsTest, DuringGetInstance) {
     createAll({"A", "B"});
     failInTurn([&] { return get("B"); }, byClass, [&] { expectRecords({"A", "B"}); });
 }
 
-TEST_P(EveryCallFailsTest, WhileOneIsCreated) {
+TEST_P(EveryCallFailsTest, DuringCreateInstance) {
     createAll({"A"});
     const auto putBack = [&] {
         const auto there = identifiers();
@@ -244,7 +244,7 @@ TEST_P(EveryCallFailsTest, WhileOneIsCreated) {
     expectRecordsAfterReload({"A"});
 }
 
-TEST_P(EveryCallFailsTest, WhileOneIsDeleted) {
+TEST_P(EveryCallFailsTest, DuringDeleteInstance) {
     createAll({"A", "B"});
     const auto putBack = [&] {
         const auto there = identifiers();
@@ -258,7 +258,7 @@ TEST_P(EveryCallFailsTest, WhileOneIsDeleted) {
     expectRecordsAfterReload({"A", "B"});
 }
 
-TEST_P(EveryCallFailsTest, WhileOneIsModified) {
+TEST_P(EveryCallFailsTest, DuringModifyInstance) {
     createAll({"A"});
     const auto request = [&](const std::string& value, const std::string& date, unsigned int number) {
         return modify("A", {named(kind().textProperty, text(value)), named(kind().dateProperty, text(date)),
@@ -297,14 +297,14 @@ TEST_P(EveryCallFailsTest, WhileOneIsModified) {
     EXPECT_EQ(data(), fileOf("old", oldDate, 1));
 }
 
-TEST_P(EveryCallFailsTest, WhileAssociationsAreListed) {
+TEST_P(EveryCallFailsTest, DuringEnumerateInstancesOfAnAssociation) {
     createAll({"A"});
     const ObjectPath all = classPath(std::string(kind().className) + "Setting");
     failInTurn([&] { return provider().enumerateInstances(all); }, byClass, [&] { expectRecords({"A"}); });
     failInTurn([&] { return provider().enumerateInstanceNames(all); }, byClass, [&] { expectRecords({"A"}); });
 }
 
-TEST_P(EveryCallFailsTest, WhileAssociationsAreFollowed) {
+TEST_P(EveryCallFailsTest, DuringAssociators) {
     createAll({"A"});
     const cimhost::AssociationFilter filter{std::string(kind().className) + "Setting", {}, {}, {}};
     for (const ObjectPath& source :

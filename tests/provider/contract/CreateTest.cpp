@@ -23,7 +23,7 @@ protected:
         return provider().createInstance(path, clientInstance(path, {}));
     }
 
-    /** Answers the key with these data. */
+    /** Creates a record by a path whose key has these data. */
     Outcome createByData(const CMPIData& data, CMPIrc rc = CMPI_RC_OK) {
         broker.answerData(getKey, "InstanceID", data, rc);
         Outcome outcome = create("ignored");
@@ -39,7 +39,7 @@ protected:
         return data;
     }
 
-    /** That nothing was made and the request was a success without an instance. */
+    /** Expects that nothing was created and that the request succeeded without an instance. */
     void expectNothingMade(const Outcome& outcome) {
         EXPECT_THAT(outcome, isOk(1));
         EXPECT_THAT(outcome.events, SizeIs(1));
@@ -48,7 +48,7 @@ protected:
         EXPECT_THAT(loggedFailures(), IsEmpty());
     }
 
-    /** That the record "A" was made although the namespace could not be had, which is therefore empty. */
+    /** Expects that the record "A" was created with an empty namespace, since the namespace could not be read. */
     void expectMadeWithoutNamespace(const Outcome& outcome, CMPIrc rc) {
         EXPECT_EQ(outcome.rc, rc);
         EXPECT_FALSE(outcome.hasMessage);
@@ -58,7 +58,7 @@ protected:
         EXPECT_EQ(data(), dataOfNew({"A"}));
     }
 
-    /** The number of the call of getCharPtr, within a creation, that is for the namespace. */
+    /** Returns the number of the getCharPtr call for the namespace within a creation. */
     int callForNamespace() {
         EXPECT_THAT(create("probe"), isOk(1));
         EXPECT_THAT(remove("probe"), isOk(0));
@@ -79,7 +79,7 @@ protected:
     }
 };
 
-TEST_P(CreateTest, AnswersTheNewInstanceAndOneEndButNoPath) {
+TEST_P(CreateTest, ReturnsTheNewInstanceAndOneDoneButNoPath) {
     const Outcome outcome = create("A");
     EXPECT_THAT(outcome, isOk(1));
     ASSERT_THAT(outcome.events, SizeIs(2));
@@ -92,14 +92,14 @@ TEST_P(CreateTest, AnswersTheNewInstanceAndOneEndButNoPath) {
     EXPECT_EQ(broker.count("CMPIResultFT.returnDone"), 1);
 }
 
-TEST_P(CreateTest, TheNewInstanceIsTheAnswerAlsoAmongOtherRecords) {
+TEST_P(CreateTest, ReturnsTheNewInstanceAmongOtherRecords) {
     createAll({"A", "B"});
     const Outcome outcome = create("C");
     EXPECT_THAT(identifiersOf(outcome.instances()), ElementsAre("C"));
     EXPECT_THAT(identifiers(), ElementsAre("A", "B", "C"));
 }
 
-TEST_P(CreateTest, TheInstanceThatTheClientSentIsNotLookedAt) {
+TEST_P(CreateTest, TheSentInstanceIsIgnored) {
     const Instance sent =
         clientInstance(path("other"), {named("InstanceID", text("other")), named(kind().textProperty, text("sent")),
                                        named(kind().numberProperty, uint32(9))});
@@ -109,7 +109,7 @@ TEST_P(CreateTest, TheInstanceThatTheClientSentIsNotLookedAt) {
     EXPECT_EQ(data(), dataOfNew({"A"}));
 }
 
-TEST_P(CreateTest, ANullInstanceIsAsGoodAsAnyOther) {
+TEST_P(CreateTest, ANullInstanceIsAccepted) {
     CMPIInstanceMI* interface = provider().instanceMI();
     const Outcome outcome = provider().call([&](auto& scope, const CMPIContext* context, const CMPIResult* result) {
         return interface->ft->createInstance(interface, context, result, scope.objectPath(path("A")), nullptr);
@@ -128,20 +128,20 @@ TEST_P(CreateTest, ADuplicateIsOnlyLogged) {
     EXPECT_EQ(data(), dataOfNew({"A", "B"}));
 }
 
-TEST_P(CreateTest, AnIdentifierThatDiffersInLetterCaseIsNoDuplicate) {
+TEST_P(CreateTest, AnIdentifierThatDiffersInCaseIsNoDuplicate) {
     createAll({"a", "A"});
     EXPECT_THAT(identifiers(), ElementsAre("a", "A"));
 }
 
-TEST_P(CreateTest, APathWithoutKeysMakesNothing) {
+TEST_P(CreateTest, APathWithoutKeysCreatesNothing) {
     expectNothingMade(provider().createInstance(allPath(), clientInstance(allPath(), {})));
 }
 
-TEST_P(CreateTest, APathWithAnotherKeyMakesNothing) {
+TEST_P(CreateTest, APathWithAnotherKeyCreatesNothing) {
     expectNothingMade(createByKeys({named("Name", text("A"))}));
 }
 
-TEST_P(CreateTest, AKeyThatIsNoTextMakesNothing) {
+TEST_P(CreateTest, AKeyOfAnotherTypeCreatesNothing) {
     for (const cimhost::Value& key :
          {uint32(1), testsupport::boolean(true), testsupport::uint64(1), testsupport::reference(path("A")),
           testsupport::dateTime("20240506070809.000000+000")}) {
@@ -149,15 +149,15 @@ TEST_P(CreateTest, AKeyThatIsNoTextMakesNothing) {
     }
 }
 
-TEST_P(CreateTest, ANullStringAsKeyMakesNothing) {
+TEST_P(CreateTest, ANullStringAsKeyCreatesNothing) {
     expectNothingMade(createByData(stringData(nullptr)));
 }
 
-TEST_P(CreateTest, AKeyStringWithoutCharactersMakesNothing) {
+TEST_P(CreateTest, AKeyStringWithoutCharactersCreatesNothing) {
     expectNothingMade(createByData(stringData(broker.stringWithoutCharacters())));
 }
 
-TEST_P(CreateTest, AKeyInTheStateNullMakesNothingWhateverItPointsTo) {
+TEST_P(CreateTest, AKeyInTheNullStateCreatesNothing) {
     for (CMPIString* string : {broker.string("A"), broker.stringWithoutCharacters()}) {
         CMPIData data = stringData(string);
         data.state = CMPI_nullValue;
@@ -165,18 +165,18 @@ TEST_P(CreateTest, AKeyInTheStateNullMakesNothingWhateverItPointsTo) {
     }
 }
 
-TEST_P(CreateTest, AKeyThatCannotBeReadMakesNothing) {
+TEST_P(CreateTest, AKeyThatCannotBeReadCreatesNothing) {
     expectNothingMade(createByData(stringData(nullptr), CMPI_RC_ERR_FAILED));
     expectNothingMade(createByData(stringData(broker.string("A")), CMPI_RC_ERR_NOT_FOUND));
 }
 
-TEST_P(CreateTest, AnEmptyIdentifierMakesARecord) {
+TEST_P(CreateTest, AnEmptyIdentifierCreatesARecord) {
     EXPECT_THAT(identifiersOf(create("").instances()), ElementsAre(""));
     EXPECT_THAT(identifiers(), ElementsAre(""));
     EXPECT_EQ(data(), dataOfNew({""})) << "an empty line";
 }
 
-TEST_P(CreateTest, TheNamespaceOfThePathIsThatOfTheNewInstance) {
+TEST_P(CreateTest, TheNewInstanceHasTheNamespaceOfThePath) {
     ObjectPath elsewhere = path("A");
     elsewhere.nameSpace = "root/elsewhere";
     const Outcome outcome = provider().createInstance(elsewhere, clientInstance(elsewhere, {}));
@@ -184,14 +184,14 @@ TEST_P(CreateTest, TheNamespaceOfThePathIsThatOfTheNewInstance) {
     EXPECT_EQ(outcome.instances().front().path.nameSpace, "root/elsewhere");
 }
 
-TEST_P(CreateTest, ANamespaceThatCannotBeReadGivesItsCodeWhileTheRecordIsMade) {
+TEST_P(CreateTest, AFailureToReadTheNamespaceIsReturnedAndTheRecordIsCreated) {
     broker.failEvery(getNameSpace, CMPI_RC_ERR_INVALID_NAMESPACE);
     const Outcome outcome = create("A");
     broker.obey();
     expectMadeWithoutNamespace(outcome, CMPI_RC_ERR_INVALID_NAMESPACE);
 }
 
-TEST_P(CreateTest, NamespaceCharactersThatCannotBeReadGiveTheirCodeWhileTheRecordIsMade) {
+TEST_P(CreateTest, AFailureToReadTheNamespaceCharactersIsReturnedAndTheRecordIsCreated) {
     const int call = callForNamespace();
     broker.failCall(getCharPtr, call, CMPI_RC_ERR_FAILED);
     const Outcome outcome = create("A");
@@ -199,7 +199,7 @@ TEST_P(CreateTest, NamespaceCharactersThatCannotBeReadGiveTheirCodeWhileTheRecor
     expectMadeWithoutNamespace(outcome, CMPI_RC_ERR_FAILED);
 }
 
-TEST_P(CreateTest, NamespaceCharactersThatAreNullMeanTheEmptyNamespace) {
+TEST_P(CreateTest, NullNamespaceCharactersMeanTheEmptyNamespace) {
     const int call = callForNamespace();
     broker.answerNothing(getCharPtr, call);
     const Outcome outcome = create("A");
@@ -214,7 +214,7 @@ TEST_P(CreateTest, ANullNamespaceStringMeansTheEmptyNamespace) {
     expectMadeWithoutNamespace(outcome, CMPI_RC_OK);
 }
 
-TEST_P(CreateTest, TheCodeOfTheNamespaceStaysWhenNothingIsMade) {
+TEST_P(CreateTest, TheNamespaceFailureIsReturnedIfNothingIsCreated) {
     broker.failEvery(getNameSpace, CMPI_RC_ERR_ACCESS_DENIED);
     const Outcome outcome = createByKeys({});
     EXPECT_EQ(outcome.rc, CMPI_RC_ERR_ACCESS_DENIED);
@@ -223,7 +223,7 @@ TEST_P(CreateTest, TheCodeOfTheNamespaceStaysWhenNothingIsMade) {
     EXPECT_THAT(outcome.instances(), IsEmpty());
 }
 
-TEST_P(CreateTest, TheCodeOfTheNamespaceStaysWhenTheIdentifierIsTaken) {
+TEST_P(CreateTest, TheNamespaceFailureIsReturnedIfTheIdentifierExists) {
     createAll({"A"});
     broker.failEvery(getNameSpace, CMPI_RC_ERR_ACCESS_DENIED);
     const Outcome outcome = create("A");
@@ -233,7 +233,7 @@ TEST_P(CreateTest, TheCodeOfTheNamespaceStaysWhenTheIdentifierIsTaken) {
     EXPECT_THAT(caughtFailures(), ElementsAre(kind().exists));
 }
 
-TEST_P(CreateTest, AResultThatRefusesTheInstanceIsNotHeeded) {
+TEST_P(CreateTest, AFailureOfReturnInstanceIsIgnored) {
     broker.failEvery("CMPIResultFT.returnInstance", CMPI_RC_ERR_NOT_SUPPORTED);
     const Outcome outcome = create("A");
     EXPECT_THAT(outcome, isOk(1));
@@ -244,7 +244,7 @@ TEST_P(CreateTest, AResultThatRefusesTheInstanceIsNotHeeded) {
     EXPECT_THAT(loggedFailures(), IsEmpty());
 }
 
-TEST_P(CreateTest, OnlyLeasesLogThatTheInstanceWasCreated) {
+TEST_P(CreateTest, OnlyLeasesLogTheCreation) {
     create("A");
     int lines = 0;
     for (const LogRecord& record : logOf()) {
@@ -255,7 +255,7 @@ TEST_P(CreateTest, OnlyLeasesLogThatTheInstanceWasCreated) {
 
 INSTANTIATE_RECORD_TEST(CreateTest);
 
-TEST_F(ProviderTest, CreationOfAnUnservedClassHasTheCodeOfTheClassAlsoWithoutANamespace) {
+TEST_F(ProviderTest, CreationOfAnUnservedClassReturnsInvalidClassEvenWithoutANamespace) {
     broker.failEvery(getNameSpace, CMPI_RC_ERR_ACCESS_DENIED);
     for (const char* className : {"VELKO_OstrelAgent", "VELKO_AssetIDDetails", "VELKO_LeaseSetting", "VELKO_Unknown"}) {
         const ObjectPath path = keyedPath(className, "A");

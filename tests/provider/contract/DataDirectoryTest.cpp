@@ -1,6 +1,6 @@
 #include "RecordFixture.h"
 
-// Requests while the data file or its directory cannot be used.
+// Requests while the data file or its directory is not accessible.
 
 namespace contract {
 namespace {
@@ -13,7 +13,7 @@ using testsupport::text;
 
 class DataDirectoryTest : public RecordTest {
 protected:
-    /** That the rewrite failed and is told of at error level on both channels, by the store and by the entry point. */
+    /** Expects that the store and the entry point logged the failed rewrite at error level on both channels. */
     void expectRewriteFailure() {
         EXPECT_THAT(loggedFailures(), ElementsAre(kind().cannotOpen, kind().cannotOpen));
         EXPECT_THAT(loggedFailures("trace"), ElementsAre(kind().cannotOpen, kind().cannotOpen));
@@ -22,7 +22,7 @@ protected:
     }
 };
 
-TEST_P(DataDirectoryTest, CreationWithoutADirectoryAnswersTheInstanceAndKeepsItInMemory) {
+TEST_P(DataDirectoryTest, CreationWithoutADirectoryReturnsTheInstanceAndKeepsItInMemory) {
     std::filesystem::remove_all(agentEnvironment::dataDirectory());
     const Outcome outcome = create("A");
     EXPECT_THAT(outcome, isOk(1)) << "the end was sent before the file was written";
@@ -44,7 +44,7 @@ TEST_P(DataDirectoryTest, ChangesToAFileThatCannotBeOpenedStayInMemory) {
     EXPECT_THAT(loggedFailures(), IsEmpty()) << "reading needs no file";
 }
 
-TEST_P(DataDirectoryTest, TheNextChangeAfterwardsWritesEverything) {
+TEST_P(DataDirectoryTest, TheNextSuccessfulChangeWritesEverything) {
     blockData(kind().dataFile);
     create("A");
     create("B");
@@ -56,7 +56,7 @@ TEST_P(DataDirectoryTest, TheNextChangeAfterwardsWritesEverything) {
     EXPECT_EQ(data(), dataOfNew({"A", "B", "C"}));
 }
 
-TEST_P(DataDirectoryTest, AFailureOfTheRequestItselfDoesNotTryToWrite) {
+TEST_P(DataDirectoryTest, AFailedRequestDoesNotWriteTheFile) {
     create("A");
     blockData(kind().dataFile);
     agentEnvironment::forgetLog();
@@ -66,14 +66,14 @@ TEST_P(DataDirectoryTest, AFailureOfTheRequestItselfDoesNotTryToWrite) {
     EXPECT_THAT(loggedFailures(), testing::Not(testing::Contains(kind().cannotOpen)));
 }
 
-TEST_P(DataDirectoryTest, AFileThatIsADirectoryAtTheStartIsAnEmptyTable) {
+TEST_P(DataDirectoryTest, ADirectoryInPlaceOfTheFileLoadsAsAnEmptyTable) {
     blockData(kind().dataFile);
     EXPECT_THAT(identifiers(), IsEmpty());
     EXPECT_THAT(provider().enumerateInstances(allPath()), isOk(1));
     EXPECT_THAT(loggedFailures(), IsEmpty());
 }
 
-TEST_P(DataDirectoryTest, ADirectoryThatIsMissingAtTheStartIsAnEmptyTable) {
+TEST_P(DataDirectoryTest, AMissingDirectoryLoadsAsAnEmptyTable) {
     std::filesystem::remove_all(agentEnvironment::dataDirectory());
     EXPECT_THAT(identifiers(), IsEmpty());
     EXPECT_THAT(loggedFailures(), IsEmpty());
@@ -82,7 +82,7 @@ TEST_P(DataDirectoryTest, ADirectoryThatIsMissingAtTheStartIsAnEmptyTable) {
     EXPECT_EQ(data(), dataOfNew({"A"}));
 }
 
-TEST_P(DataDirectoryTest, AFullDeviceDoesNotEndTheProcess) {
+TEST_P(DataDirectoryTest, AFullDeviceDoesNotTerminateTheProcess) {
     create("A");
     freeData(kind().dataFile);
     std::filesystem::create_symlink("/dev/full", dataFile(kind().dataFile));
@@ -93,7 +93,7 @@ TEST_P(DataDirectoryTest, AFullDeviceDoesNotEndTheProcess) {
     EXPECT_EQ(data(), dataOfNew({"A", "B", "C"}));
 }
 
-TEST_P(DataDirectoryTest, TheOtherClassIsNotDisturbed) {
+TEST_P(DataDirectoryTest, TheOtherClassIsNotAffected) {
     blockData(kind().dataFile);
     const RecordClass& other = std::string(kind().name) == "Lease" ? warranty : lease;
     const ObjectPath otherPath = keyedPath(other.className, "A");

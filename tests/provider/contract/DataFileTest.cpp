@@ -5,7 +5,7 @@
 #include <filesystem>
 #include <utility>
 
-// The record files, byte for byte, and what a restart makes of them.
+// Content of the record files, byte for byte, and reading it after a restart.
 
 namespace contract {
 namespace {
@@ -21,7 +21,7 @@ constexpr const char* noDate = "00000000000000.000000-000";
 
 class DataFileTest : public RecordTest {
 protected:
-    /** The file's content with one record "A" that has these two lines after its identifier and nothing else. */
+    /** Returns a file with one record "A" with these two lines after its identifier and default values otherwise. */
     std::string oneRecord(const std::string& textLine, const std::string& dateLine,
                           const std::string& identifier = "A") {
         const std::string defaults = kind().defaultFields;
@@ -29,7 +29,7 @@ protected:
                defaults.substr(std::string("*\n").size() + std::string(noDate).size() + 1);
     }
 
-    /** What the text property is after a restart, when this was sent. */
+    /** Returns the value of the string property after a restart. */
     std::string afterRestart(const std::string& sent) {
         modify("A", {named(kind().textProperty, text(sent))});
         unload();
@@ -39,7 +39,7 @@ protected:
     }
 };
 
-TEST_P(DataFileTest, BlanksInTextsAreWrittenAsUnderscoresAndComeBackAsBlanks) {
+TEST_P(DataFileTest, BlanksAreWrittenAsUnderscoresAndReadBackAsBlanks) {
     createAll({"A"});
     EXPECT_EQ(afterRestart("ACME Leasing Co"), "ACME Leasing Co");
     EXPECT_EQ(data(), oneRecord("ACME_Leasing_Co", noDate));
@@ -47,7 +47,7 @@ TEST_P(DataFileTest, BlanksInTextsAreWrittenAsUnderscoresAndComeBackAsBlanks) {
     EXPECT_EQ(data(), oneRecord("with_underscore", noDate));
 }
 
-TEST_P(DataFileTest, TextsOfOneCharacterAreLostAtARestart) {
+TEST_P(DataFileTest, StringsOfOneCharacterAreLostAtARestart) {
     createAll({"A"});
     for (const char* lost : {"X", "*", " ", "_", ""}) {
         EXPECT_EQ(afterRestart(lost), "") << lost;
@@ -57,7 +57,7 @@ TEST_P(DataFileTest, TextsOfOneCharacterAreLostAtARestart) {
     EXPECT_EQ(afterRestart("**"), "**");
 }
 
-TEST_P(DataFileTest, IdentifiersWithBlanksAndUnderscoresComeBackWithBlanks) {
+TEST_P(DataFileTest, IdentifiersWithBlanksAndUnderscoresAreReadBackWithBlanks) {
     createAll({"record 1"});
     EXPECT_EQ(data(), dataOfNew({"record_1"}));
     createAll({"record_1"});
@@ -67,7 +67,7 @@ TEST_P(DataFileTest, IdentifiersWithBlanksAndUnderscoresComeBackWithBlanks) {
     EXPECT_THAT(recordOf("record_1"), IsEmpty());
 }
 
-TEST_P(DataFileTest, DatesShorterThanADatetimeAreWrittenAsNone) {
+TEST_P(DataFileTest, DatesShorterThanADatetimeAreWrittenAsTheDefaultDate) {
     createAll({"A"});
     for (const char* brief : {"", "x", "20240506070809.123456+12"}) {
         modify("A", {named(kind().dateProperty, text("20240506070809.123456+120"))});
@@ -76,7 +76,7 @@ TEST_P(DataFileTest, DatesShorterThanADatetimeAreWrittenAsNone) {
     }
 }
 
-TEST_P(DataFileTest, DatesOfADatetimesLengthOrMoreAreWrittenUnchanged) {
+TEST_P(DataFileTest, DatesOfAtLeastADatetimesLengthAreWrittenUnchanged) {
     createAll({"A"});
     for (const char* date :
          {"20240506070809.123456+120", "20240506070809.123456+1200", "no date but long enough here"}) {
@@ -85,7 +85,7 @@ TEST_P(DataFileTest, DatesOfADatetimesLengthOrMoreAreWrittenUnchanged) {
     }
 }
 
-TEST_P(DataFileTest, ARecordAlwaysTakesItsNumberOfLines) {
+TEST_P(DataFileTest, ARecordHasAFixedNumberOfLines) {
     createAll({"A", "B", "C"});
     modify("B", {named(kind().textProperty, text("a b c")), named(kind().numberProperty, uint32(4294967295U))});
     const std::string content = *data();
@@ -94,7 +94,7 @@ TEST_P(DataFileTest, ARecordAlwaysTakesItsNumberOfLines) {
     EXPECT_EQ(content.back(), '\n');
 }
 
-TEST_P(DataFileTest, ARestartKeepsTheOrderOfTheRecordsAndForgetsDeletedOnes) {
+TEST_P(DataFileTest, ARestartKeepsTheOrderOfTheRecordsWithoutDeletedOnes) {
     createAll({"C", "A", "B", "D"});
     remove("A");
     createAll({"A"});
@@ -132,14 +132,14 @@ TEST_P(DataFileTest, AFileThatIsShorterThanItsCountRepeatsTheLastRecord) {
     EXPECT_EQ(data(), dataOfNew({"A", "A", "A", "B"}));
 }
 
-TEST_P(DataFileTest, RecordsBeyondTheCountAreNotReadAndVanishAtTheNextChange) {
+TEST_P(DataFileTest, RecordsBeyondTheCountAreIgnoredAndRemovedByTheNextChange) {
     writeData(kind().dataFile, "1\n" + dataOfNew({"A", "B"}).substr(2));
     EXPECT_THAT(identifiers(), ElementsAre("A"));
     remove("A");
     EXPECT_EQ(data(), "0\n");
 }
 
-TEST_P(DataFileTest, ACountThatIsNoneMeansNoRecords) {
+TEST_P(DataFileTest, AnInvalidCountMeansNoRecords) {
     for (const char* count : {"", "\n", "0\n", "0", "none\n", "-1\n", "99999999999999999999\n", ".5\n", "\xff\n"}) {
         writeData(kind().dataFile, count + dataOfNew({"A"}).substr(2));
         EXPECT_THAT(identifiers(), IsEmpty()) << count;
@@ -150,14 +150,14 @@ TEST_P(DataFileTest, ACountThatIsNoneMeansNoRecords) {
     }
 }
 
-TEST_P(DataFileTest, ACountThatNoMemoryHoldsMeansNoRecords) {
+TEST_P(DataFileTest, ACountThatExceedsMemoryMeansNoRecords) {
     writeData(kind().dataFile, "4294967295\n");
     EXPECT_THAT(identifiers(), IsEmpty());
     createAll({"N"});
     EXPECT_EQ(data(), dataOfNew({"N"}));
 }
 
-TEST_P(DataFileTest, LinesEndedAsOnOtherSystemsAreReadAlike) {
+TEST_P(DataFileTest, CarriageReturnsAreIgnored) {
     std::string content;
     for (const char character : dataOfNew({"A", "B"})) {
         content += character == '\n' ? "\r\n" : std::string(1, character);
@@ -167,7 +167,7 @@ TEST_P(DataFileTest, LinesEndedAsOnOtherSystemsAreReadAlike) {
     EXPECT_EQ(recordOf("B"), kind().shownRecord("B"));
 }
 
-TEST_P(DataFileTest, ANumberThatIsNoneEndsTheReadingAndLaterRecordsRepeatWhatWasRead) {
+TEST_P(DataFileTest, AnInvalidNumberEndsReadingAndLaterRecordsAreCopies) {
     testsupport::RecordModel model(kind().fields());
     model.records = {model.newRecord("A"), model.newRecord("B"), model.newRecord("C")};
     const std::string sound = model.written();
@@ -179,7 +179,7 @@ TEST_P(DataFileTest, ANumberThatIsNoneEndsTheReadingAndLaterRecordsRepeatWhatWas
     EXPECT_THAT(identifiers(), ElementsAre("A", "B", "B"));
 }
 
-TEST_P(DataFileTest, NumbersWithAPlusSignAreReadAndTheNextChangeWritesAllRecords) {
+TEST_P(DataFileTest, NumbersWithAPlusSignAreAccepted) {
     const std::string sound = dataOfNew({"A", "B"});
     std::string signedNumbers = "+" + sound;
     const std::string number = std::string(noDate) + "\n";
@@ -190,7 +190,7 @@ TEST_P(DataFileTest, NumbersWithAPlusSignAreReadAndTheNextChangeWritesAllRecords
     EXPECT_EQ(data(), dataOfNew({"A", "B", "N"}));
 }
 
-TEST_P(DataFileTest, AFileIsMadeForWhomTheUmaskLetsInAndKeepsItsMode) {
+TEST_P(DataFileTest, ANewFileHasTheModeOfTheUmaskAndKeepsIt) {
     const std::filesystem::path file = dataFile(kind().dataFile);
     const auto modeOf = [&] { return static_cast<unsigned int>(std::filesystem::status(file).permissions()); };
     for (const auto& [mask, mode] : {std::pair(mode_t{0}, 0666U), std::pair(mode_t{027}, 0640U)}) {
@@ -206,7 +206,7 @@ TEST_P(DataFileTest, AFileIsMadeForWhomTheUmaskLetsInAndKeepsItsMode) {
 
 INSTANTIATE_RECORD_TEST(DataFileTest);
 
-TEST_F(ProviderTest, AFlagThatIsAWordEndsTheReadingOfALease) {
+TEST_F(ProviderTest, ANonNumericFlagEndsReadingOfLeases) {
     writeData("Lease.dat",
               "2\nA\nThe_Lessor\n00000000000000.000000-000\n12\ntrue\n1\n1\n1\n100\n200\n300\n400\n5\n"
               "B\n*\n00000000000000.000000-000\n0\n0\n0\n0\n0\n*\n*\n*\n*\n0\n");

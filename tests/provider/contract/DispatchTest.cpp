@@ -2,7 +2,7 @@
 
 #include <functional>
 
-// Which operation serves which class, and what the rest answers.
+// Operations by class, and operations with a fixed status.
 
 namespace contract {
 namespace {
@@ -13,7 +13,7 @@ constexpr CMPIrc ok = CMPI_RC_OK;
 constexpr CMPIrc invalidClass = CMPI_RC_ERR_INVALID_CLASS;
 constexpr CMPIrc notSupported = CMPI_RC_ERR_NOT_SUPPORTED;
 
-/** An answer of an operation: its code, and how often it says that it is done. */
+/** Expected status of an operation and number of calls of returnDone. */
 struct Answer {
     CMPIrc rc;
     int doneCount;
@@ -24,16 +24,16 @@ constexpr Answer servedInSilence{ok, 0};
 constexpr Answer refused{invalidClass, 0};
 constexpr Answer unsupported{notSupported, 0};
 
-/** A class, in the letters that a client may use, and what each operation answers for it, none of its records there. */
+/** A class and the expected response of each operation if it has no records. */
 struct DispatchRow {
-    std::vector<const char*> names;  ///< null: no name at all, where an operation can be given none
+    std::vector<const char*> names;  ///< spellings of the class name; null for none
     Answer enumerateInstanceNames;
     Answer enumerateInstances;
     Answer getInstance;
     Answer createInstance;
     Answer modifyInstance;
     Answer deleteInstance;
-    Answer associators;  ///< by the name of the association class; the same for their names
+    Answer associators;  ///< by the name of the association class; AssociatorNames likewise
 };
 
 // clang-format off
@@ -62,7 +62,7 @@ std::string shownName(const char* name) {
 
 class DispatchTest : public ProviderTest {
 protected:
-    /** One computer system, so that association classes have something to list. */
+    /** One computer system, so that association classes are not empty. */
     DispatchTest() {
         broker.serve("VELKO_ComputerSystem", {clientInstance(computerPath(), {})});
         provider();
@@ -81,7 +81,7 @@ protected:
         broker.forget();
     }
 
-    /** The path of a class; a path that knows no class name for null. */
+    /** Returns a path of the class; for null, a path without a class name. */
     ObjectPath pathOf(const char* className) {
         if (className == nullptr) {
             broker.answerNothingEver("CMPIObjectPathFT.getClassName");
@@ -113,7 +113,7 @@ protected:
     }
 };
 
-TEST_F(DispatchTest, InstanceOperationsServeTheClassesThatTheyAreFor) {
+TEST_F(DispatchTest, InstanceOperationsServeTheirClasses) {
     for (const DispatchRow& row : rows) {
         for (const char* className : row.names) {
             expectInstanceAnswers(row, className);
@@ -129,14 +129,14 @@ TEST_F(DispatchTest, AssociationOperationsServeTheTwoAssociationClasses) {
     }
 }
 
-TEST_F(DispatchTest, ARefusedClassTouchesNothingButThePathsClassName) {
+TEST_F(DispatchTest, OnlyTheClassNameOfARejectedPathIsRead) {
     provider().enumerateInstances(classPath("VELKO_ComputerSystem"));
     for (const std::string& function : broker.functions()) {
         EXPECT_TRUE(function == "CMPIObjectPathFT.getClassName" || function == "CMPIStringFT.getCharPtr") << function;
     }
 }
 
-TEST_F(DispatchTest, TheSourcePathsClassDoesNotMakeAnAssociationClass) {
+TEST_F(DispatchTest, TheClassOfTheSourcePathIsNotUsedAsAssociationClass) {
     const ObjectPath path = classPath("VELKO_LeaseSetting");
     EXPECT_THAT(provider().associators(path, {}), isRefused(invalidClass));
     EXPECT_THAT(provider().associatorNames(path, {}), isRefused(invalidClass));
@@ -166,7 +166,7 @@ TEST_F(DispatchTest, QueriesAreNotSupportedForAnyClass) {
     EXPECT_THAT(broker.calls(), IsEmpty());
 }
 
-TEST_F(DispatchTest, CleanupIsASuccessThatTouchesNothing) {
+TEST_F(DispatchTest, CleanupSucceedsAndChangesNothing) {
     for (const bool terminating : {false, true}) {
         EXPECT_THAT(provider().cleanupInstanceMI(terminating), isOk(0));
         EXPECT_THAT(provider().cleanupAssociationMI(terminating), isOk(0));
@@ -174,7 +174,7 @@ TEST_F(DispatchTest, CleanupIsASuccessThatTouchesNothing) {
     EXPECT_THAT(broker.calls(), IsEmpty());
 }
 
-TEST_F(DispatchTest, FixedAnswersNeedNoArguments) {
+TEST_F(DispatchTest, OperationsWithAFixedStatusNeedNoArguments) {
     CMPIInstanceMI* instances = provider().instanceMI();
     CMPIAssociationMI* associations = provider().associationMI();
     EXPECT_EQ(instances->ft->cleanup(nullptr, nullptr, 1).rc, ok);
@@ -185,7 +185,10 @@ TEST_F(DispatchTest, FixedAnswersNeedNoArguments) {
     EXPECT_EQ(associations->ft->referenceNames(nullptr, nullptr, nullptr, nullptr, nullptr, nullptr).rc, notSupported);
 }
 
-/** Function, level and text of the records of the log channel; of the text, what stands before the line number. */
+/**
+ * Returns function, level and message of the records of the log channel; the message without its part from the line
+ * number on.
+ */
 std::vector<std::string> logLines() {
     std::vector<std::string> lines;
     for (const LogRecord& record : logOf()) {
@@ -195,7 +198,7 @@ std::vector<std::string> logLines() {
     return lines;
 }
 
-TEST_F(DispatchTest, OperationsWithAFixedAnswerLogOneLineEach) {
+TEST_F(DispatchTest, OperationsWithAFixedStatusLogOneLineEach) {
     const auto logged = [&](const std::function<void()>& request) {
         agentEnvironment::forgetLog();
         request();
@@ -214,13 +217,13 @@ TEST_F(DispatchTest, OperationsWithAFixedAnswerLogOneLineEach) {
     EXPECT_EQ(logged([&] { provider().referenceNames(path, {}); }), method("LeaseAndWarranty_ReferenceNames"));
 }
 
-/** A class and the number that stands for it. */
+/** A class and its number. */
 struct ClassIdCase {
     const char* className;
     const char* classId;
 };
 
-TEST_F(DispatchTest, TheClassIdIsLoggedBehindTheEntry) {
+TEST_F(DispatchTest, TheClassIdIsLoggedAfterTheEntry) {
     for (const ClassIdCase& each : {ClassIdCase{"VELKO_Lease", "20"}, ClassIdCase{"VELKO_Warranty", "21"},
                                     ClassIdCase{"VELKO_LeaseSetting", "25"}, ClassIdCase{"VELKO_WarrantySetting", "32"},
                                     ClassIdCase{"VELKO_OstrelAgent", "208"}, ClassIdCase{"VELKO_AssetIDDetails", "209"},

@@ -4,7 +4,7 @@
 #include <functional>
 #include <stdexcept>
 
-// What an object manager written in C++ may do to a provider: throw out of its functions.
+// Object manager functions that throw C++ exceptions.
 
 namespace contract {
 namespace {
@@ -21,14 +21,14 @@ using testsupport::text;
 
 constexpr const char* thrownText = "the broker throws";
 
-/** A text whose characters throw, and who gives it: functions of tables know no other way to it. */
+/** A string whose getCharPtr throws. Global, since functions of the tables have no other access to it. */
 CMPIString* throwingText = nullptr;
 
 CMPIString* giveThrowingText(const CMPIObjectPath*, CMPIStatus*) {
     return throwingText;
 }
 
-/** What of a request's path throws. */
+/** The part of a request's path that throws. */
 struct ThrowingPart {
     const char* name;
     void (*alter)(CMPIObjectPathFT& table);
@@ -45,7 +45,7 @@ class ExceptionTest : public RecordTest {
 protected:
     using Alter = std::function<void(CMPIResultFT&)>;
 
-    /** An enumeration of instances whose result has some functions replaced. */
+    /** Enumerates instances into a result with replaced functions. */
     Outcome enumerateInto(const Alter& alter) {
         return call(
             [&](CMPIInstanceMI* interface, const CMPIContext* context, const CMPIResult* result,
@@ -55,7 +55,7 @@ protected:
             alter, allPath());
     }
 
-    /** A creation of a record with such a result. */
+    /** Creates a record with such a result. */
     Outcome createInto(const std::string& instanceId, const Alter& alter) {
         return call(
             [&](CMPIInstanceMI* interface, const CMPIContext* context, const CMPIResult* result,
@@ -75,7 +75,7 @@ protected:
         });
     }
 
-    /** The value that an action throws, an int; -1 when it throws none. */
+    /** Returns the int that an action throws; -1 if it throws none. */
     template <class Action>
     static int thrownNumber(Action action) {
         try {
@@ -86,7 +86,7 @@ protected:
         return -1;
     }
 
-    /** Calls createInstance with nothing between it and the exception that it may throw. */
+    /** Calls createInstance without catching exceptions. */
     void createDirectly(const std::string& instanceId, const Alter& alter) {
         CMPIInstanceMI* interface = provider().instanceMI();
         cimhost::ResultEvents events;
@@ -97,13 +97,13 @@ protected:
                                       scope.objectPath(path(instanceId)), nullptr);
     }
 
-    /** A request of the interfaces, and its name. */
+    /** A named request. */
     struct Request {
         const char* name;
         std::function<CMPIStatus(const CMPIContext*, const CMPIResult*, const CMPIObjectPath*)> run;
     };
 
-    /** Every request that is dispatched by class. */
+    /** Returns every request that is dispatched by class. */
     std::vector<Request> dispatchedRequests() {
         CMPIInstanceMI* mi = provider().instanceMI();
         CMPIAssociationMI* ai = provider().associationMI();
@@ -151,7 +151,7 @@ protected:
     static void throwNumber(CMPIResultFT& table) { throwNumberFrom(table.returnInstance); }
 };
 
-TEST_P(ExceptionTest, AStandardExceptionEndsTheRequestAsASuccessWithoutItsEnd) {
+TEST_P(ExceptionTest, AStandardExceptionEndsTheRequestSuccessfullyWithoutDone) {
     createAll({"A", "B"});
     const Outcome outcome = enumerateInto(throwError);
     EXPECT_THAT(outcome, isOk(0));
@@ -159,7 +159,7 @@ TEST_P(ExceptionTest, AStandardExceptionEndsTheRequestAsASuccessWithoutItsEnd) {
     EXPECT_THAT(caughtFailures(), ElementsAre(thrownText));
 }
 
-TEST_P(ExceptionTest, TheCaughtExceptionIsLoggedOnBothChannelsAsAnError) {
+TEST_P(ExceptionTest, CaughtExceptionsAreLoggedAtErrorLevelOnBothChannels) {
     createAll({"A"});
     agentEnvironment::forgetLog();
     enumerateInto(throwError);
@@ -183,7 +183,7 @@ TEST_P(ExceptionTest, TheCaughtExceptionIsLoggedOnBothChannelsAsAnError) {
     }
 }
 
-TEST_P(ExceptionTest, ResultsBeforeTheExceptionStay) {
+TEST_P(ExceptionTest, ResultsBeforeTheExceptionAreKept) {
     createAll({"A", "B", "C"});
     static int calls;
     calls = 0;
@@ -202,7 +202,7 @@ TEST_P(ExceptionTest, ResultsBeforeTheExceptionStay) {
     EXPECT_THAT(caughtFailures(), ElementsAre("third"));
 }
 
-TEST_P(ExceptionTest, AnExceptionFromTheEndIsASuccessToo) {
+TEST_P(ExceptionTest, AnExceptionFromReturnDoneIsCaught) {
     createAll({"A"});
     const Outcome outcome = enumerateInto([](CMPIResultFT& table) { throwFrom<std::runtime_error>(table.returnDone); });
     EXPECT_THAT(outcome, isOk(0));
@@ -210,7 +210,7 @@ TEST_P(ExceptionTest, AnExceptionFromTheEndIsASuccessToo) {
     EXPECT_THAT(caughtFailures(), ElementsAre(thrownText));
 }
 
-TEST_P(ExceptionTest, ExceptionsFromTheBrokersMakersAreCaught) {
+TEST_P(ExceptionTest, ExceptionsFromTheBrokersFactoryFunctionsAreCaught) {
     createAll({"A"});
     AlteredBroker altered(broker.handle());
     throwFrom<std::runtime_error>(altered.makers.newInstance);
@@ -254,7 +254,7 @@ TEST_P(ExceptionTest, ExceptionsFromClassNameAndNamespaceAreCaughtInEveryRequest
     EXPECT_EQ(data(), dataOfNew({"A"}));
 }
 
-TEST_P(ExceptionTest, TheCodeThatANamespaceLeftBeforeItThrewIsTheAnswer) {
+TEST_P(ExceptionTest, AStatusOfTheNamespaceBeforeAnExceptionIsReturned) {
     CMPIInstanceMI* interface = provider().instanceMI();
     const Outcome outcome = provider().call([&](auto& scope, const CMPIContext* context, const CMPIResult* result) {
         Altered<CMPIObjectPath> altered(scope.objectPath(path("A")));
@@ -270,7 +270,7 @@ TEST_P(ExceptionTest, TheCodeThatANamespaceLeftBeforeItThrewIsTheAnswer) {
     EXPECT_THAT(identifiers(), IsEmpty());
 }
 
-TEST_P(ExceptionTest, ValuesReadBeforeAnExceptionInAModificationAreWritten) {
+TEST_P(ExceptionTest, ValuesSetBeforeAnExceptionAreWritten) {
     createAll({"A"});
     CMPIInstanceMI* interface = provider().instanceMI();
     static CMPIData (*original)(const CMPIInstance*, const char*, CMPIStatus*);
@@ -298,7 +298,7 @@ TEST_P(ExceptionTest, ValuesReadBeforeAnExceptionInAModificationAreWritten) {
     EXPECT_EQ(recordOf("A"), changed) << stored;
 }
 
-TEST_P(ExceptionTest, ARecordMadeBeforeTheExceptionIsKeptAndWritten) {
+TEST_P(ExceptionTest, ARecordCreatedBeforeAnExceptionIsWritten) {
     const Outcome outcome = createInto("A", throwError);
     EXPECT_THAT(outcome, isOk(0));
     EXPECT_THAT(outcome.events, IsEmpty());
@@ -306,7 +306,7 @@ TEST_P(ExceptionTest, ARecordMadeBeforeTheExceptionIsKeptAndWritten) {
     EXPECT_EQ(data(), dataOfNew({"A"}));
 }
 
-TEST_P(ExceptionTest, AFailingRewriteBehindAnExceptionIsLoggedAndTheFirstExceptionGoesOn) {
+TEST_P(ExceptionTest, AFailedRewriteDuringUnwindingIsLoggedAndTheFirstExceptionPropagates) {
     blockData(kind().dataFile);
     const Outcome outcome = createInto("A", throwError);
     EXPECT_THAT(outcome, isOk(0));
@@ -317,7 +317,7 @@ TEST_P(ExceptionTest, AFailingRewriteBehindAnExceptionIsLoggedAndTheFirstExcepti
     EXPECT_THAT(identifiers(), ElementsAre("A"));
 }
 
-TEST_P(ExceptionTest, AnExceptionOfAnotherKindLeavesTheEntryPoint) {
+TEST_P(ExceptionTest, ANonstandardExceptionLeavesTheEntryPoint) {
     EXPECT_EQ(thrownNumber([&] { createDirectly("A", throwNumber); }), 42);
     EXPECT_THAT(loggedFailures(), IsEmpty());
     EXPECT_THAT(functionsLogged(), AllOf(Contains("markProviderEntry"), Not(Contains("markProviderExit"))));
@@ -327,7 +327,7 @@ TEST_P(ExceptionTest, AnExceptionOfAnotherKindLeavesTheEntryPoint) {
     EXPECT_THAT(identifiers(), ElementsAre("A", "B"));
 }
 
-TEST_P(ExceptionTest, AFailingRewriteBehindAnExceptionOfAnotherKindIsLoggedAndTheExceptionLeaves) {
+TEST_P(ExceptionTest, AFailedRewriteDuringUnwindingOfANonstandardExceptionIsLogged) {
     blockData(kind().dataFile);
     EXPECT_EQ(thrownNumber([&] { createDirectly("A", throwNumber); }), 42);
     EXPECT_THAT(loggedFailures(), Contains(kind().cannotOpen));
@@ -338,7 +338,7 @@ TEST_P(ExceptionTest, AFailingRewriteBehindAnExceptionOfAnotherKindIsLoggedAndTh
     EXPECT_EQ(data(), dataOfNew({"A", "B"}));
 }
 
-TEST_P(ExceptionTest, ARequestMadeWhileAnExceptionLeavesTheCallerIsServed) {
+TEST_P(ExceptionTest, ARequestDuringUnwindingOfTheCallerIsServed) {
     provider().instanceMI();
     struct RequestAtEnd {
         std::function<void()> request;

@@ -1,6 +1,6 @@
 #include "ProviderFixture.h"
 
-// The two factories and what they return.
+// The two factories and their results.
 
 namespace contract {
 namespace {
@@ -21,7 +21,7 @@ protected:
     }
 };
 
-TEST_F(FactoryTest, TheInstanceInterfaceIsNamedAndOfVersion200) {
+TEST_F(FactoryTest, TheInstanceInterfaceHasItsNameAndVersion200) {
     const CMPIInstanceMI* interface = makeInstanceMI();
     ASSERT_NE(interface, nullptr);
     EXPECT_EQ(interface->hdl, nullptr);
@@ -39,7 +39,7 @@ TEST_F(FactoryTest, TheInstanceInterfaceIsNamedAndOfVersion200) {
     EXPECT_NE(interface->ft->execQuery, nullptr);
 }
 
-TEST_F(FactoryTest, TheAssociationInterfaceIsNamedAndOfVersion200) {
+TEST_F(FactoryTest, TheAssociationInterfaceHasItsNameAndVersion200) {
     const CMPIAssociationMI* interface = makeAssociationMI();
     ASSERT_NE(interface, nullptr);
     EXPECT_EQ(interface->hdl, nullptr);
@@ -67,7 +67,7 @@ TEST_F(FactoryTest, FactoriesWriteNoStatusCallNothingAndLogNothing) {
     EXPECT_THAT(agentEnvironment::log(), IsEmpty());
 }
 
-TEST_F(FactoryTest, FactoriesGiveTheSameInterfaceBeforeAndAfterRequests) {
+TEST_F(FactoryTest, FactoriesReturnTheSameInterfaceBeforeAndAfterRequests) {
     CMPIInstanceMI* instances = makeInstanceMI();
     CMPIAssociationMI* associations = makeAssociationMI();
     EXPECT_THAT(provider().enumerateInstances(classPath("VELKO_Lease")), isOk(1));
@@ -87,12 +87,12 @@ TEST_F(FactoryTest, RequestsWorkAfterCleanup) {
     EXPECT_THAT(provider().enumerateInstanceNames(classPath("VELKO_Lease")).paths(), SizeIs(1));
 }
 
-/** Whose objects a request for leases is answered with. */
+/** Two brokers that count the objects they create for a request. */
 class TwoBrokersTest : public FactoryTest {
 protected:
     TwoBrokersTest() { writeData("Lease.dat", "1\nA\n*\n00000000000000.000000-000\n0\n0\n0\n0\n0\n*\n*\n*\n*\n0\n"); }
 
-    /** How many object paths each broker made for an enumeration of names. */
+    /** Returns the number of object paths that each broker created for an enumeration of names. */
     std::vector<int> pathsMade() {
         broker.forget();
         other.forget();
@@ -131,7 +131,7 @@ TEST_F(TwoBrokersTest, CleanupKeepsTheBroker) {
     EXPECT_THAT(pathsMade(), ElementsAre(1, 0));
 }
 
-TEST_F(FactoryTest, ANullBrokerIsTakenAndRequestsFindNoObjectsToReturn) {
+TEST_F(FactoryTest, ANullBrokerIsAcceptedAndRequestsReturnNoObjects) {
     writeData("Lease.dat", "1\nA\n*\n00000000000000.000000-000\n0\n0\n0\n0\n0\n*\n*\n*\n*\n0\n");
     EXPECT_NE(provider().createInstanceMI(nullptr, nullptr), nullptr);
     const Outcome outcome = provider().enumerateInstances(classPath("VELKO_Lease"));

@@ -6,7 +6,7 @@
 
 #include "support/Files.h"
 
-// Texts that clients send to do harm: what becomes of them in memory, in the file and in the log.
+// Malicious strings of clients in memory, in the file and in the log.
 
 namespace contract {
 namespace {
@@ -18,7 +18,7 @@ using testsupport::named;
 using testsupport::RecordModel;
 using testsupport::text;
 
-/** A text with all that is special, repeated up to a length. */
+/** Returns a string of all special characters, repeated up to a length. */
 std::string longText(std::size_t length) {
     std::string all;
     while (all.size() < length) {
@@ -70,7 +70,7 @@ const std::vector<std::string>& hostileTexts() {
     return texts;
 }
 
-/** Everything of a log record but what it says. */
+/** Returns all fields of a log record except its message. */
 std::string shapeOf(const LogRecord& record) {
     return record.channel + " " + std::to_string(record.level) + " " + record.logger + " " + record.function + " " +
            record.file + " " + std::to_string(record.line);
@@ -84,7 +84,7 @@ std::vector<std::string> shapeOfLog() {
     return shapes;
 }
 
-/** The lines of the log file that are not what one record is: eight fields of printable characters. */
+/** Returns the lines of the log file that are not valid records: eight fields of printable characters. */
 std::vector<std::string> malformedLogLines() {
     std::vector<std::string> malformed;
     std::ifstream stream(agentEnvironment::logFile(), std::ios::binary);
@@ -103,7 +103,7 @@ class HostileTextTest : public RecordTest {
 protected:
     HostileTextTest() : model(kind().fields()) {}
 
-    /** @name Requests, done to the model as well */
+    /** @name Requests that also change the model */
     ///@{
     void createBoth(const std::string& instanceId) {
         const bool isTaken = model.find(instanceId) != nullptr;
@@ -115,7 +115,7 @@ protected:
         }
     }
 
-    /** Sets all text properties of a record to a text. */
+    /** Sets all string properties of a record to a value. */
     void modifyBoth(const std::string& instanceId, const std::string& value) {
         std::vector<NamedValue> properties;
         ModelRecord* record = model.find(instanceId);
@@ -143,7 +143,7 @@ protected:
     }
     ///@}
 
-    /** That memory and file are as the model has them. */
+    /** Expects that memory and file match the model. */
     void expectAgreement() {
         EXPECT_EQ(data().value_or("0\n"), model.written());
         const Outcome outcome = provider().enumerateInstances(allPath());
@@ -155,7 +155,7 @@ protected:
         EXPECT_EQ(there, model.shownRecords());
     }
 
-    /** That memory is as the model has it, which has just been read from the file. */
+    /** Expects that memory matches the model after the file was read. */
     void expectAgreementAfterRestart() {
         restartBoth();
         const std::string before = data().value_or("");
@@ -169,14 +169,14 @@ protected:
         EXPECT_EQ(data().value_or(""), before);
     }
 
-    /** Starts anew, without records and log. */
+    /** Restarts without records and log. */
     void startAnew() {
         unload();
         agentEnvironment::clear();
         model.records.clear();
     }
 
-    /** What the log looks like when a record with that identifier and text lives and dies. */
+    /** Returns the log of creating, modifying and deleting a record with that identifier and value. */
     std::vector<std::string> logOfLife(const std::string& instanceId, const std::string& value) {
         startAnew();
         create(instanceId);
@@ -191,7 +191,7 @@ protected:
     RecordModel model;
 };
 
-TEST_P(HostileTextTest, IdentifiersLiveInMemoryAndComeBackAsTheFileHasThem) {
+TEST_P(HostileTextTest, IdentifiersAreKeptInMemoryAndReloadedFromTheFile) {
     for (const std::string& hostile : hostileTexts()) {
         SCOPED_TRACE(testing::PrintToString(hostile.substr(0, 50)));
         startAnew();
@@ -204,7 +204,7 @@ TEST_P(HostileTextTest, IdentifiersLiveInMemoryAndComeBackAsTheFileHasThem) {
     }
 }
 
-TEST_P(HostileTextTest, ValuesLiveInMemoryAndComeBackAsTheFileHasThem) {
+TEST_P(HostileTextTest, ValuesAreKeptInMemoryAndReloadedFromTheFile) {
     for (const std::string& hostile : hostileTexts()) {
         SCOPED_TRACE(testing::PrintToString(hostile.substr(0, 50)));
         startAnew();
@@ -231,7 +231,7 @@ TEST_P(HostileTextTest, RecordsWithHostileIdentifiersCanBeFoundAndDeleted) {
     EXPECT_EQ(data(), "0\n");
 }
 
-TEST_P(HostileTextTest, TheLogHasTheRecordsOfAnyOtherRequestAndNoneForged) {
+TEST_P(HostileTextTest, LogRecordsCannotBeForged) {
     const auto harmless = logOfLife("harmless", "harmless");
     for (const std::string& hostile : hostileTexts()) {
         SCOPED_TRACE(testing::PrintToString(hostile.substr(0, 50)));
@@ -240,7 +240,7 @@ TEST_P(HostileTextTest, TheLogHasTheRecordsOfAnyOtherRequestAndNoneForged) {
     }
 }
 
-TEST_P(HostileTextTest, TheFailureOfADuplicateIsLoggedAlikeForAnyIdentifier) {
+TEST_P(HostileTextTest, ADuplicateIsLoggedAlikeForAnyIdentifier) {
     for (const std::string& hostile : hostileTexts()) {
         startAnew();
         create(hostile);
@@ -250,7 +250,7 @@ TEST_P(HostileTextTest, TheFailureOfADuplicateIsLoggedAlikeForAnyIdentifier) {
     }
 }
 
-TEST_P(HostileTextTest, TheClassNameOfARequestForgesNoRecord) {
+TEST_P(HostileTextTest, ClassNamesCannotForgeLogRecords) {
     provider();
     for (const std::string& hostile : hostileTexts()) {
         agentEnvironment::forgetLog();
@@ -260,8 +260,8 @@ TEST_P(HostileTextTest, TheClassNameOfARequestForgesNoRecord) {
     }
 }
 
-/** Requests in no order, of which each may damage the file for the next start. */
-TEST_P(HostileTextTest, AnySequenceOfRequestsAndRestartsIsAsTheRulesHaveIt) {
+/** Random requests, each of which may damage the file for the next load. */
+TEST_P(HostileTextTest, AnySequenceOfRequestsAndRestartsMatchesTheModel) {
     std::mt19937 random(20240506);
     const auto below = [&](std::size_t limit) { return static_cast<std::size_t>(random() % limit); };
     const auto word = [&] {

@@ -12,7 +12,7 @@
 #include <memory>
 #include <stdexcept>
 
-// The built library as a file, and its coming and going.
+// The built library as a file; loading and unloading.
 
 namespace contract {
 namespace {
@@ -35,7 +35,7 @@ struct DynamicSymbol {
     int visibility;
 };
 
-/** A table of structures inside a file's bytes. */
+/** Returns a table of structures in a file's bytes. */
 template <class Entry>
 std::vector<Entry> entriesAt(const std::string& bytes, std::size_t offset, std::size_t count) {
     std::vector<Entry> entries(count);
@@ -76,13 +76,13 @@ TEST(LibraryFileTest, ExportsExactlyTheTwoFactories) {
                                                "LeaseAndWarrantyProvider_Create_AssociationMI"));
 }
 
-TEST(LibraryFileTest, HasNoSymbolThatKeepsItInTheProcess) {
+TEST(LibraryFileTest, HasNoSymbolThatPreventsUnloading) {
     for (const DynamicSymbol& symbol : dynamicSymbols(libraryFile())) {
         EXPECT_NE(symbol.binding, STB_GNU_UNIQUE) << symbol.name;
     }
 }
 
-/** What a command of the shell writes, errors included. */
+/** Returns the output of a shell command, including errors. */
 std::string outputOf(const std::string& command) {
     const std::unique_ptr<FILE, int (*)(FILE*)> pipe(popen((command + " 2>&1").c_str(), "r"), pclose);
     std::string output;
@@ -106,14 +106,14 @@ TEST(LibraryFileTest, LeavesNoSymbolUnresolved) {
 
 class LoadingTest : public RecordTest {
 protected:
-    /** The identifiers of all records, by a library loaded with these flags and closed again. */
+    /** Loads the library with these flags, returns the identifiers of all records, and unloads the library. */
     std::vector<std::string> identifiersThrough(int flags) {
         testsupport::ProviderLibrary own(libraryFile(), "LeaseAndWarrantyProvider", broker, flags);
         return identifiersOf(own.enumerateInstanceNames(allPath()).paths());
     }
 };
 
-TEST_P(LoadingTest, LoadsAsObjectManagersLoadIt) {
+TEST_P(LoadingTest, LoadsWithTheFlagsOfObjectManagers) {
     writeData(kind().dataFile, dataOfNew({"A", "B"}));
     for (const int flags : {RTLD_NOW | RTLD_GLOBAL, RTLD_LAZY | RTLD_GLOBAL, RTLD_NOW | RTLD_LOCAL, RTLD_LAZY}) {
         EXPECT_THAT(identifiersThrough(flags), ElementsAre("A", "B")) << flags;
@@ -121,7 +121,7 @@ TEST_P(LoadingTest, LoadsAsObjectManagersLoadIt) {
     }
 }
 
-TEST_P(LoadingTest, EachLoadReadsTheFileAnewAndEachUnloadReallyUnloads) {
+TEST_P(LoadingTest, EachLoadReadsTheFileAndEachUnloadRemovesTheLibrary) {
     for (int round = 0; round < 50; ++round) {
         const std::string existing = "round" + std::to_string(round);
         writeData(kind().dataFile, dataOfNew({existing}));
@@ -143,7 +143,7 @@ TEST_P(LoadingTest, UnloadingWritesNothing) {
     EXPECT_EQ(data(), "somebody else's");
 }
 
-TEST_P(LoadingTest, TheFileIsReadWhenTheLibraryIsLoadedNotLater) {
+TEST_P(LoadingTest, TheFileIsReadWhenTheLibraryIsLoaded) {
     writeData(kind().dataFile, dataOfNew({"A"}));
     provider();
     writeData(kind().dataFile, dataOfNew({"A", "B"}));

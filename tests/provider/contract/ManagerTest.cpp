@@ -2,7 +2,7 @@
 
 #include <tuple>
 
-// Brokers and values as object managers of the field have them.
+// Behaviour of brokers and values of existing object managers.
 
 namespace contract {
 namespace {
@@ -15,7 +15,7 @@ using testsupport::named;
 using testsupport::text;
 using testsupport::uint32;
 
-/** Every operation once, with the values expected of any broker. */
+/** Makes each request once and expects the results that every broker must yield. */
 class ManagerTest : public RecordTest {
 protected:
     void expectWholeLifeOfRecords() {
@@ -38,7 +38,7 @@ protected:
         EXPECT_THAT(provider().getInstance(classPath("VELKO_AssetIDDetails")).instances(), SizeIs(1));
     }
 
-    /** The record "A" after a modification in which a property is read as these data. */
+    /** Returns the record "A" after a modification in which a property has these data. */
     std::vector<std::string> afterReading(const char* property, const CMPIData& data) {
         broker.answerData("CMPIInstanceFT.getProperty", property, data);
         EXPECT_THAT(modify("A", {}), isOk(0));
@@ -54,19 +54,19 @@ protected:
     }
 };
 
-TEST_P(ManagerTest, VersionZeroAndMissingFunctionsAreNoHindrance) {
+TEST_P(ManagerTest, VersionZeroAndMissingFunctionsAreAccepted) {
     broker.poseAs(Manager::sfcb);
     ASSERT_EQ(broker.handle()->bft->brokerVersion, 0);
     expectWholeLifeOfRecords();
 }
 
-TEST_P(ManagerTest, AMissingMemoryTableIsNoHindrance) {
+TEST_P(ManagerTest, AMissingMemoryTableIsAccepted) {
     broker.poseAs(Manager::openPegasus);
     ASSERT_EQ(broker.handle()->mft, nullptr);
     expectWholeLifeOfRecords();
 }
 
-TEST_P(ManagerTest, NoServiceOfTheBrokerBesidesObjectsIsUsed) {
+TEST_P(ManagerTest, NoBrokerServicesExceptObjectCreationAreUsed) {
     expectWholeLifeOfRecords();
     for (const std::string& function : broker.functions()) {
         EXPECT_NE(function.substr(0, function.find('.')), "CMPIBrokerMemFT") << function;
@@ -76,7 +76,7 @@ TEST_P(ManagerTest, NoServiceOfTheBrokerBesidesObjectsIsUsed) {
     }
 }
 
-TEST_P(ManagerTest, AnUnsetTextMayPointToAStringWithoutCharacters) {
+TEST_P(ManagerTest, AnUnsetStringMayPointToAStringWithoutCharacters) {
     createAll({"A"});
     modify("A", {named(kind().textProperty, text("kept"))});
     const auto kept = recordOf("A");
@@ -89,7 +89,7 @@ TEST_P(ManagerTest, AnUnsetTextMayPointToAStringWithoutCharacters) {
     }
 }
 
-TEST_P(ManagerTest, ATextWithoutCharactersIsNoValueInAnyState) {
+TEST_P(ManagerTest, AStringWithoutCharactersIsNoValueInAnyState) {
     createAll({"A"});
     modify("A", {named(kind().textProperty, text("kept"))});
     const auto kept = recordOf("A");
@@ -118,7 +118,7 @@ TEST_P(ManagerTest, ANumberInTheStateNullOrNotFoundIsNoValue) {
     }
 }
 
-TEST_P(ManagerTest, AValueThatIsAKeysIsAValue) {
+TEST_P(ManagerTest, AValueInTheKeyStateIsAValue) {
     createAll({"A"});
     CMPIData data = dataOf(CMPI_uint32, CMPI_keyValue);
     data.value.uint32 = 99;
@@ -126,7 +126,7 @@ TEST_P(ManagerTest, AValueThatIsAKeysIsAValue) {
               kind().shownRecord("A", {std::string(kind().numberProperty) + "=99"}));
 }
 
-TEST_P(ManagerTest, AKeyThatIsCountedButCannotBeReadMakesNothing) {
+TEST_P(ManagerTest, AKeyThatIsCountedButCannotBeReadCreatesNothing) {
     CMPIData unusable = dataOf(CMPI_string, CMPI_nullValue);
     for (CMPIString* string : {static_cast<CMPIString*>(nullptr), broker.string("")}) {
         unusable.value.string = string;
@@ -152,7 +152,7 @@ TEST_P(ManagerTest, AKeyWithoutCharactersSelectsNothing) {
     EXPECT_THAT(identifiers(), ElementsAre("A", "B"));
 }
 
-TEST_P(ManagerTest, AnEmptyNamespaceAndANullOneServeAsWell) {
+TEST_P(ManagerTest, AnEmptyAndANullNamespaceAreAccepted) {
     createAll({"A"});
     ObjectPath nowhere = allPath();
     nowhere.nameSpace.clear();
@@ -163,7 +163,7 @@ TEST_P(ManagerTest, AnEmptyNamespaceAndANullOneServeAsWell) {
     EXPECT_THAT(identifiers(), ElementsAre("A"));
 }
 
-TEST_P(ManagerTest, ANullContextIsTaken) {
+TEST_P(ManagerTest, ANullContextIsAccepted) {
     createAll({"A"});
     CMPIInstanceMI* interface = provider().instanceMI();
     const Outcome outcome = provider().call([&](auto& scope, const CMPIContext*, const CMPIResult* result) {

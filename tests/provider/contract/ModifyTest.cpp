@@ -21,7 +21,7 @@ constexpr const char* date = "20240506070809.123456+120";
 
 class ModifyTest : public RecordTest {
 protected:
-    /** What shown() has for the class's text, number and date property. */
+    /** Returns the string, number and date property of a record in the format of shown(). */
     std::string shownText(const std::string& value) const {
         return std::string(kind().textProperty) + "=\"" + value + '"';
     }
@@ -32,7 +32,7 @@ protected:
         return std::string(kind().dateProperty) + "=\"" + value + '"';
     }
 
-    /** Sends one property for the record "A" and answers the record as it then is. */
+    /** Sets one property of the record "A" and returns the record. */
     std::vector<std::string> after(const char* property, const cimhost::Value& value) {
         const Outcome outcome = modify("A", {named(property, value)});
         EXPECT_THAT(outcome, isOk(0));
@@ -40,7 +40,7 @@ protected:
         return recordOf("A");
     }
 
-    /** That the file was not rewritten by what is done. */
+    /** Expects that an action does not rewrite the file. */
     template <class Action>
     void expectNoRewrite(Action action) {
         writeData(kind().dataFile, "mark");
@@ -49,7 +49,7 @@ protected:
     }
 };
 
-TEST_P(ModifyTest, ReturnsNothingNotEvenItsEnd) {
+TEST_P(ModifyTest, ReturnsNothingAndNoDone) {
     createAll({"A"});
     const Outcome outcome = modify("A", {named(kind().textProperty, text("changed"))});
     EXPECT_THAT(outcome, isOk(0));
@@ -57,7 +57,7 @@ TEST_P(ModifyTest, ReturnsNothingNotEvenItsEnd) {
     EXPECT_EQ(recordOf("A"), kind().shownRecord("A", {shownText("changed")}));
 }
 
-TEST_P(ModifyTest, ChangesOnlyTheRecordThatTheKeyNames) {
+TEST_P(ModifyTest, ChangesOnlyTheRecordWithTheKey) {
     createAll({"A", "B", "C"});
     modify("B", {named(kind().numberProperty, uint32(12))});
     EXPECT_EQ(recordOf("A"), kind().shownRecord("A"));
@@ -85,7 +85,7 @@ TEST_P(ModifyTest, NullsChangeNothing) {
     EXPECT_EQ(recordOf("A"), before);
 }
 
-TEST_P(ModifyTest, AnEmptyTextIsAValue) {
+TEST_P(ModifyTest, AnEmptyStringIsAValue) {
     createAll({"A"});
     after(kind().textProperty, text("text"));
     EXPECT_EQ(after(kind().textProperty, text("")), kind().shownRecord("A"));
@@ -104,7 +104,7 @@ TEST_P(ModifyTest, ValuesOfAnotherTypeChangeNothing) {
     EXPECT_THAT(loggedFailures(), IsEmpty());
 }
 
-TEST_P(ModifyTest, NumbersOfAnyIntegerTypeThatFitAreTaken) {
+TEST_P(ModifyTest, NumbersOfAnyIntegerTypeAreAcceptedIfTheyFit) {
     createAll({"A"});
     const auto shownAs = [&](unsigned int number) { return kind().shownRecord("A", {shownNumber(number)}); };
     constexpr std::uint64_t largest = std::numeric_limits<std::uint32_t>::max();
@@ -118,14 +118,14 @@ TEST_P(ModifyTest, NumbersOfAnyIntegerTypeThatFitAreTaken) {
     EXPECT_EQ(after(kind().numberProperty, sint32(-1)), shownAs(0));
 }
 
-TEST_P(ModifyTest, DatesAreTakenAsDatetimeAndAsText) {
+TEST_P(ModifyTest, DatesAreAcceptedAsDatetimeAndAsString) {
     createAll({"A"});
     EXPECT_EQ(after(kind().dateProperty, dateTime(date)), kind().shownRecord("A", {shownDate(date)}));
     EXPECT_EQ(after(kind().dateProperty, text("20231231235959.000000-300")),
               kind().shownRecord("A", {shownDate("20231231235959.000000-300")}));
 }
 
-TEST_P(ModifyTest, ADateThatIsNoneIsShownAsNull) {
+TEST_P(ModifyTest, AnInvalidDateIsReturnedAsNull) {
     createAll({"A"});
     for (const char* none : {"", "yesterday", "00000000000000.000000-000", "20240506070809.123456+1200"}) {
         EXPECT_EQ(after(kind().dateProperty, text(none)), kind().shownRecord("A")) << none;
@@ -143,7 +143,7 @@ TEST_P(ModifyTest, ReadOnlyPropertiesAreIgnored) {
     EXPECT_EQ(recordOf("A"), kind().shownRecord("A"));
 }
 
-TEST_P(ModifyTest, ReadOnlyPropertiesDoNotHinderTheOthers) {
+TEST_P(ModifyTest, OtherPropertiesAreSetBesideReadOnlyOnes) {
     createAll({"A"});
     modify("A",
            {named("Caption", text("Z")), named(kind().numberProperty, uint32(24)), named("InstanceID", text("Z"))});
@@ -184,14 +184,14 @@ TEST_P(ModifyTest, WithoutAKeyTheFirstRecordIsChanged) {
     }
 }
 
-TEST_P(ModifyTest, AMissingRecordIsOnlyLogged) {
+TEST_P(ModifyTest, AnUnknownRecordIsOnlyLogged) {
     createAll({"A"});
     expectNoRewrite([&] { EXPECT_THAT(modify("B", {named(kind().textProperty, text("x"))}), isOk(0)); });
     EXPECT_THAT(caughtFailures(), ElementsAre(kind().notAvailable));
     EXPECT_EQ(recordOf("A"), kind().shownRecord("A"));
 }
 
-TEST_P(ModifyTest, AMissingRecordIsNotEvenLoggedWhenNothingIsToChange) {
+TEST_P(ModifyTest, AnUnknownRecordIsNotLoggedIfNothingIsSet) {
     createAll({"A"});
     EXPECT_THAT(modify("B", {named("Caption", text("x"))}), isOk(0));
     EXPECT_THAT(loggedFailures(), IsEmpty());
@@ -217,7 +217,7 @@ TEST_P(ModifyTest, ANullInstanceChangesNothing) {
     });
 }
 
-TEST_P(ModifyTest, SettingTheSameValueAgainStillRewritesTheFile) {
+TEST_P(ModifyTest, SettingTheSameValueRewritesTheFile) {
     createAll({"A"});
     freeData(kind().dataFile);
     after(kind().numberProperty, uint32(0));

@@ -23,66 +23,69 @@ using cimhost::NamedValue;
 using cimhost::ObjectPath;
 using testsupport::Outcome;
 
-/** The namespace of all requests, unless a test says otherwise. */
+/** The default namespace of requests. */
 constexpr const char* nameSpace = "root/cimv2";
 
-/** The path of a class in the namespace. */
+/** Returns the path of a class. */
 ObjectPath classPath(const std::string& className);
 
-/** The path of the instance whose only key "InstanceID" is this. */
+/** Returns the path of the instance with this "InstanceID" as its only key. */
 ObjectPath keyedPath(const std::string& className, const std::string& instanceId);
 
-/** The path of the computer system that the agent of these tests knows, "testhost". */
+/** Returns the path of a computer system, by default the one of the test agent. */
 ObjectPath computerPath(const std::string& name = "testhost");
 
-/** An instance as a client sends it: its path and properties. */
+/** Returns an instance that a client sends. */
 Instance clientInstance(const ObjectPath& path, std::vector<NamedValue> properties);
 
-/** The values of the key "InstanceID" of paths, of the property of that name of instances; "(none)" without one. */
+/** Return the key or property "InstanceID" of paths or instances; "(none)" if there is none. */
 std::vector<std::string> identifiersOf(const std::vector<ObjectPath>& paths);
 std::vector<std::string> identifiersOf(const std::vector<Instance>& instances);
 
-/** Names and values of an instance's properties or a path's keys, in order, as text: "LeaseTerm=12". */
+/** Returns properties or keys in order as strings such as "LeaseTerm=12". */
 std::vector<std::string> shown(const std::vector<NamedValue>& values);
 
 /** @name The log
- * Records of the log channel, unless a channel is named.
+ * Records of the log channel, unless a channel is given.
  */
 ///@{
 std::vector<LogRecord> logOf(const std::string& channel = "log");
 
-/** The texts of all records of level 3000 that stand for failures, in order: those of the form MESSAGE. */
+/** Returns the messages of all MESSAGE records at level 3000, which report failures, in order. */
 std::vector<std::string> loggedFailures(const std::string& channel = "log");
 
-/** The same, only those that the entry points logged: what the adapters threw. */
+/** Returns those messages that the entry points logged: exceptions of the adapters. */
 std::vector<std::string> caughtFailures();
 ///@}
 
-/** That a request went well: the status is OK without a message, and it ended with this many calls of returnDone. */
+/** Matches a successful request: status OK without a message, and this number of calls of returnDone. */
 testing::Matcher<const Outcome&> isOk(int doneCount);
 
-/** That a request was answered with a code, nothing in the result, and no message. */
+/** Matches a request with this status code, no results and no message. */
 testing::Matcher<const Outcome&> isRefused(CMPIrc rc);
 
 /**
- * The provider library over an agent and a data directory that are new for each test.
+ * The provider library with a new agent and a new data directory for each test.
  *
- * Neither library nor interfaces are there before a test first asks for provider(): files written before that are
- * what the provider loads. The agent's libraries come and go with it. At the end the library is closed and must be
- * gone from the process.
+ * The library is loaded and its interfaces are created by the first call of provider(), so the provider loads files
+ * that were written before. The agent's libraries are loaded and unloaded with it. At the end, the library is unloaded
+ * and must no longer be in the process.
  */
 class ProviderTest : public testing::Test {
 protected:
     ProviderTest();
     ~ProviderTest() override;
 
-    /** The loaded provider; its factories are called with the broker's handle at the first request. */
+    /** Returns the loaded provider. Calls its factories with the broker at the first request. */
     testsupport::ProviderLibrary& provider();
 
-    /** Closes the library. It must be gone; the next provider() loads it again, and with it the files. */
+    /**
+     * Unloads the library, which must then no longer be in the process. The next provider() loads it and its files
+     * again.
+     */
     void unload();
 
-    /** Whether the library is in the process. */
+    /** Returns whether the library is loaded. */
     static bool isLoaded();
 
     /** @name Files of the data directory */
@@ -90,13 +93,13 @@ protected:
     static std::filesystem::path dataFile(const std::string& name);
     static void writeData(const std::string& name, const std::string& content);
 
-    /** The content; none when there is no such file. */
+    /** Returns the content of a file; none if it does not exist. */
     static std::optional<std::string> readData(const std::string& name);
 
-    /** Puts a folder in the file's place, so that nobody can open it, the superuser included. */
+    /** Replaces the file by a directory, so that even the superuser cannot open it. */
     static void blockData(const std::string& name);
 
-    /** Makes the file's place free. */
+    /** Removes whatever is at the file's path. */
     static void freeData(const std::string& name);
     ///@}
 

@@ -9,31 +9,32 @@
 
 namespace contract {
 
-/** What tells the two classes of records apart, as clients and operators see them. */
+/** Differences between the two record classes. */
 struct RecordClass {
     const char* name;
     const char* className;
     const char* dataFile;
-    const char* defaultFields;  ///< what follows the identifier of a new record in the file
-    std::size_t linesOfRecord;  ///< in the file
+    const char* defaultFields;  ///< lines of a new record after the identifier
+    std::size_t linesOfRecord;  ///< per record of the file
 
-    std::vector<std::string> defaultProperties;  ///< of a new record's instance, without InstanceID; as shown() has it
+    std::vector<std::string>
+        defaultProperties;  ///< properties of a new record except InstanceID, in the format of shown()
     const char* textProperty;
     const char* numberProperty;
     const char* dateProperty;
 
-    const char* exists;  ///< messages of failures
+    const char* exists;  ///< failure messages
     const char* notAvailable;
     const char* identify;
     const char* cannotOpen;
 
-    /** The fields of a record in the file, for a model of it. */
+    /** Returns the fields of a record in the file, for the model. */
     const testsupport::ModelFields& fields() const;
 
-    /** The lines of a new record in the file. */
+    /** Returns the lines of a new record in the file. */
     std::string newRecord(const std::string& storedIdentifier) const { return storedIdentifier + "\n" + defaultFields; }
 
-    /** What shown() answers for the instance of a record, given those properties that are not as a new record has. */
+    /** Returns the properties of a record in the format of shown(), with some values of a new record replaced. */
     std::vector<std::string> shownRecord(const std::string& instanceId,
                                          const std::vector<std::string>& changed = {}) const;
 };
@@ -43,14 +44,14 @@ extern const RecordClass warranty;
 
 std::ostream& operator<<(std::ostream& stream, const RecordClass& recordClass);
 
-/** Requests for one class of records; a test that is a RecordTest runs for leases and for warranties. */
+/** Requests for one record class. Each RecordTest runs for leases and for warranties. */
 class RecordTest : public ProviderTest, public testing::WithParamInterface<RecordClass> {
 protected:
     const RecordClass& kind() const { return GetParam(); }
     ObjectPath allPath() const { return classPath(kind().className); }
     ObjectPath path(const std::string& instanceId) const { return keyedPath(kind().className, instanceId); }
 
-    /** @name Requests with what a client usually sends */
+    /** @name Requests with typical arguments */
     ///@{
     Outcome create(const std::string& instanceId);
     Outcome get(const std::string& instanceId);
@@ -58,23 +59,23 @@ protected:
     Outcome remove(const std::string& instanceId);
     ///@}
 
-    /** Creates records, which must succeed. */
+    /** Creates records. Fails the test if a request fails. */
     void createAll(const std::vector<std::string>& instanceIds);
 
-    /** The identifiers of all records, in order, as an enumeration of the names gives them. */
+    /** Returns the identifiers of all records in the order of EnumerateInstanceNames. */
     std::vector<std::string> identifiers();
 
-    /** The properties of a record, as shown() has them; empty when there is none. */
+    /** Returns the properties of a record in the format of shown(); empty if it does not exist. */
     std::vector<std::string> recordOf(const std::string& instanceId);
 
-    /** Content of the class's data file; none when there is no such file. */
+    /** Returns the content of the class's data file; none if it does not exist. */
     std::optional<std::string> data() const { return readData(kind().dataFile); }
 
-    /** What the data file holds with these new records in it. */
+    /** Returns the content of a data file with these new records. */
     std::string dataOfNew(const std::vector<std::string>& storedIdentifiers) const;
 };
 
-/** The name of a test for one class of records. */
+/** Returns the name of a record class for test names. */
 inline std::string nameOfKind(const testing::TestParamInfo<RecordClass>& tested) {
     return tested.param.name;
 }

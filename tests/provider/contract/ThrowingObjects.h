@@ -5,11 +5,11 @@
 #include <memory>
 #include <utility>
 
-// Objects of a broker of which single functions are replaced, by ones that throw for instance.
+// Broker objects with individually replaced functions, for example by ones that throw.
 
 namespace contract {
 
-/** A copy of an object with a function table of its own. What is not replaced works as before. */
+/** A copy of an object with a separate function table. Functions that are not replaced call the original. */
 template <class Handle>
 class Altered {
 public:
@@ -27,7 +27,7 @@ private:
     Handle object;
 };
 
-/** The same for a broker and its functions that make objects. */
+/** A copy of a broker with a separate table of creating functions. */
 class AlteredBroker {
 public:
     explicit AlteredBroker(const CMPIBroker* original) : makers(*original->eft), broker(*original) {
@@ -44,7 +44,7 @@ private:
     CMPIBroker broker;
 };
 
-/** A function of any table that throws. Thrown must be made from the text, or be an int. */
+/** A function of any table that throws. Thrown must be constructible from a string, or be int. */
 template <class Function>
 struct Throwing;
 
@@ -57,13 +57,13 @@ struct Throwing<Result (*)(Arguments...)> {
     static Result number(Arguments...) { throw 42; }
 };
 
-/** Lets a slot of a table throw a standard exception. */
+/** Replaces a slot of a table by a function that throws a standard exception. */
 template <class Thrown, class Function>
 void throwFrom(Function& slot) {
     slot = &Throwing<Function>::template error<Thrown>;
 }
 
-/** Lets a slot of a table throw the number 42. */
+/** Replaces a slot of a table by a function that throws the number 42. */
 template <class Function>
 void throwNumberFrom(Function& slot) {
     slot = &Throwing<Function>::number;

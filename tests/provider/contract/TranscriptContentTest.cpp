@@ -5,7 +5,7 @@
 #include <regex>
 #include <set>
 
-// What stands in transcripts: levels, loggers, and the records that tell scenarios apart.
+// Content of transcripts: levels, loggers, and records that differ between scenarios.
 
 namespace contract {
 namespace {
@@ -17,7 +17,7 @@ using testing::IsEmpty;
 constexpr const char* logger = "Tarvik.LeaseAndWarrantyProvider";
 constexpr const char* shortLogger = "Tarvik.LeaseWarrantyProvider";
 
-/** Where entry and exit are at the level of errors. */
+/** Returns whether entry and exit are logged at error level. */
 bool isRaised(const LogRecord& record) {
     static const std::map<std::string, std::set<std::string>> raised{
         {"CMPIComputerSystem.cpp", {"setObjectPath", "getCMPIInstance"}},
@@ -34,7 +34,7 @@ bool isRaised(const LogRecord& record) {
     return found != raised.end() && found->second.count(record.function) == 1;
 }
 
-/** The messages that tell of no failure, or of one that only the flow of control shows. */
+/** Returns messages that do not report failures, and failures that are logged at flow level only. */
 const std::set<std::string>& flowMessages() {
     static const std::set<std::string> all{"Asset.dat file opened in write mode Successfully",
                                            "Opening File",
@@ -55,7 +55,7 @@ int expectedLevel(const LogRecord& record, const Line& line) {
     return isFlow && isRaised(record) ? 3000 : 4000;
 }
 
-TEST_F(TranscriptPropertyTest, LevelsAreThoseOfTheKindOfRecord) {
+TEST_F(TranscriptPropertyTest, LevelsMatchTheKindOfRecord) {
     std::set<std::string> seenMessages;
     std::set<std::string> seenRaised;
     forEachRecord([&](const LogRecord& record, const Line& line) {
@@ -73,7 +73,7 @@ TEST_F(TranscriptPropertyTest, LevelsAreThoseOfTheKindOfRecord) {
     EXPECT_EQ(seenRaised.size(), 18U) << "not every function at the level of errors is in a scenario";
 }
 
-TEST_F(TranscriptPropertyTest, TheLoudestMessageIsWrittenOncePerOpening) {
+TEST_F(TranscriptPropertyTest, TheDetailMessageIsWrittenOncePerOpen) {
     for (const char* name : {"AssetIDDetails-enumerate-unreadable", "AssetIDDetails-modify-unwritable"}) {
         const auto records = logged(name);
         EXPECT_EQ(
@@ -83,7 +83,7 @@ TEST_F(TranscriptPropertyTest, TheLoudestMessageIsWrittenOncePerOpening) {
     }
 }
 
-TEST_F(TranscriptPropertyTest, TwoUnitsLogUnderTheShorterName) {
+TEST_F(TranscriptPropertyTest, TwoSourceFilesUseTheShorterLoggerName) {
     std::set<std::string> files;
     forEachRecord([&](const LogRecord& record, const Line&) {
         const bool isShort = record.file == "OstrelAgent.cpp" || record.file == "AssetIDDetails.cpp";
@@ -93,7 +93,7 @@ TEST_F(TranscriptPropertyTest, TwoUnitsLogUnderTheShorterName) {
     EXPECT_EQ(files.size(), 17U) << "sixteen units and the markers";
 }
 
-TEST_F(TranscriptPropertyTest, OnlyLeasesTellOfTheirCreation) {
+TEST_F(TranscriptPropertyTest, OnlyLeasesLogTheirCreation) {
     const auto created = [&](const std::string& scenario, const std::string& file) {
         const auto names = namesOf(scenario, Line::variable, file);
         return std::count(names.begin(), names.end(), "Instance Created");
@@ -109,14 +109,14 @@ TEST_F(TranscriptPropertyTest, OnlyLeasesTellOfTheirCreation) {
     });
 }
 
-/** The property list that a parameter list tells of, as its address; "0" for none. Empty when it tells of none. */
+/** Returns the address of the property list in a parameter list, "0" for null; empty if there is none. */
 std::string propertyListIn(const std::string& parameters) {
     static const std::regex list(".* properties=?(0x[0-9a-f]+|0)( .*)?");
     std::smatch part;
     return std::regex_match(parameters, part, list) ? part[1].str() : std::string();
 }
 
-TEST_F(TranscriptPropertyTest, APropertyListIsToldWhereverItIsHandedOn) {
+TEST_F(TranscriptPropertyTest, APropertyListIsLoggedWhereverItIsPassed) {
     const auto toldBy = [&](const std::string& scenario) {
         std::vector<std::string> functions;
         for (const LogRecord& record : logged(scenario)) {
@@ -128,22 +128,22 @@ TEST_F(TranscriptPropertyTest, APropertyListIsToldWhereverItIsHandedOn) {
         }
         return functions;
     };
-    for (const std::string side : {"Lease", "Warranty"}) {
-        const std::string adapter = "CMPI" + side + ".cpp ";
-        const std::string setting = "CMPI" + side + "Setting.cpp ";
-        EXPECT_THAT(toldBy(side + "-get"), IsEmpty());
-        EXPECT_THAT(toldBy(side + "-get-listed"), ElementsAre(adapter + "getCMPIInstance"));
-        EXPECT_THAT(toldBy(side + "-modify-listed"), ElementsAre(adapter + "modifyCMPIInstance"));
-        EXPECT_THAT(toldBy(side + "Setting-enumerate-listed"),
+    for (const std::string kind : {"Lease", "Warranty"}) {
+        const std::string adapter = "CMPI" + kind + ".cpp ";
+        const std::string setting = "CMPI" + kind + "Setting.cpp ";
+        EXPECT_THAT(toldBy(kind + "-get"), IsEmpty());
+        EXPECT_THAT(toldBy(kind + "-get-listed"), ElementsAre(adapter + "getCMPIInstance"));
+        EXPECT_THAT(toldBy(kind + "-modify-listed"), ElementsAre(adapter + "modifyCMPIInstance"));
+        EXPECT_THAT(toldBy(kind + "Setting-enumerate-listed"),
                     ElementsAre(setting + "getCMPIInstance", setting + "getCMPIInstance"));
-        EXPECT_THAT(toldBy(side + "Setting-from-computer-listed"),
+        EXPECT_THAT(toldBy(kind + "Setting-from-computer-listed"),
                     ElementsAre(setting + "getAssociator", adapter + "getCMPIInstance"));
-        EXPECT_THAT(toldBy(side + "Setting-from-element-listed"),
+        EXPECT_THAT(toldBy(kind + "Setting-from-element-listed"),
                     ElementsAre(setting + "getAssociator", "CMPIComputerSystem.cpp getCMPIInstance"));
     }
 }
 
-TEST_F(TranscriptPropertyTest, AssociationsNoteTheMakingAndEndOfTheirParts) {
+TEST_F(TranscriptPropertyTest, AssociationsLogConstructionAndDestructionOfTheirParts) {
     forEachTranscript([](const Scenario& scenario, const std::vector<LogRecord>& records) {
         const std::size_t found = scenario.name.find("Setting-");
         if (found == std::string::npos) {
@@ -172,7 +172,7 @@ TEST_F(TranscriptPropertyTest, AssociationsNoteTheMakingAndEndOfTheirParts) {
     });
 }
 
-TEST_F(TranscriptPropertyTest, ACountOfZeroIsLoadedLikeNoFile) {
+TEST_F(TranscriptPropertyTest, ACountOfZeroIsLoadedLikeAMissingFile) {
     const auto told = [&](const char* scenario) {
         std::vector<std::string> texts;
         for (const LogRecord& record : logged(scenario)) {
@@ -183,7 +183,7 @@ TEST_F(TranscriptPropertyTest, ACountOfZeroIsLoadedLikeNoFile) {
     EXPECT_EQ(told("load-with-zero-counts"), told("load-without-files"));
 }
 
-TEST_F(TranscriptPropertyTest, OperationsThatAreOnlyNotedLeaveOneRecordEach) {
+TEST_F(TranscriptPropertyTest, OperationsWithAFixedStatusLogOneRecordEach) {
     EXPECT_THAT(
         namesOf("only-noted", Line::method, entryUnit),
         ElementsAre("LeaseAndWarranty_ExecQuery", "LeaseAndWarranty_References", "LeaseAndWarranty_ReferenceNames",
@@ -191,7 +191,7 @@ TEST_F(TranscriptPropertyTest, OperationsThatAreOnlyNotedLeaveOneRecordEach) {
     EXPECT_EQ(logged("only-noted").size(), 5U);
 }
 
-TEST_F(TranscriptPropertyTest, EveryDispatchedOperationIsEnteredUnderItsName) {
+TEST_F(TranscriptPropertyTest, EveryDispatchedOperationLogsItsName) {
     EXPECT_THAT(namesOf("unknown-class", Line::entering, markerFile),
                 ElementsAre("LeaseAndWarranty_EnumInstanceNames", "LeaseAndWarranty_EnumInstances",
                             "LeaseAndWarranty_GetInstance", "LeaseAndWarranty_CreateInstance",
@@ -200,7 +200,7 @@ TEST_F(TranscriptPropertyTest, EveryDispatchedOperationIsEnteredUnderItsName) {
     EXPECT_EQ(logged("unknown-class").size(), 8U * 5U) << "rule, entry, class id, exit, rule";
 }
 
-TEST_F(TranscriptPropertyTest, WhatEndsARequestIsLoggedWhereItIsThrownAndWhereItIsCaught) {
+TEST_F(TranscriptPropertyTest, ExceptionsAreLoggedWhereTheyAreThrownAndCaught) {
     const std::map<std::string, std::string> failures{
         {"Lease-create-duplicate", "Lease with the supplied instance Id exists."},
         {"Warranty-create-duplicate", "Warranty with the supplied instance Id exists."},

@@ -7,16 +7,16 @@
 
 namespace contract {
 
-/** @name Where records come from */
+/** @name Sources of records */
 ///@{
 constexpr const char* entryUnit = "LeaseAndWarrantyProvider.cpp";
-constexpr const char* markerFile = "sdk/kolib/include/Trace.h";  ///< of the records that mark begin and end
+constexpr const char* markerFile = "sdk/kolib/include/Trace.h";  ///< of the marker records
 ///@}
 
-/** What stands before and behind every request. */
+/** Separator line before and after every request. */
 extern const std::string rule;
 
-/** The kind of a record and what its text says. */
+/** The parsed message of a record. */
 struct Line {
     enum Kind { entering, exiting, method, variable, message, requestRule, unknown };
     Kind kind = unknown;
@@ -26,16 +26,16 @@ struct Line {
     std::string value{};  ///< of the variable; the message; the parameter list
 };
 
-/** Reads a text; its kind is unknown unless the text has exactly one of the forms. */
+/** Parses a message. Its kind is unknown unless the message has exactly one of the formats. */
 Line lineOf(const std::string& text);
 
-/** The records of one channel. */
+/** Returns the records of one channel. */
 std::vector<LogRecord> channel(const std::vector<LogRecord>& records, const char* name);
 
-/** Checks that hold for every transcript, whatever its golden file says. */
+/** Checks every transcript, independently of its golden file. */
 class TranscriptPropertyTest : public TranscriptTest {
 protected:
-    /** Runs a check over what each scenario logs, both channels. */
+    /** Calls a check with the records of each scenario, both channels. */
     template <class Check>
     void forEachTranscript(Check check) {
         for (const Scenario& scenario : scenarios()) {
@@ -46,7 +46,7 @@ protected:
         }
     }
 
-    /** The same over the records of the log channel, one by one. */
+    /** Calls a check with each record of the log channel of each scenario. */
     template <class Check>
     void forEachRecord(Check check) {
         forEachTranscript([&](const Scenario&, const std::vector<LogRecord>& records) {
@@ -56,13 +56,13 @@ protected:
         });
     }
 
-    /** What a scenario logs; it is run once in the process. */
+    /** Returns the records of a scenario, which runs once per process. */
     const std::vector<LogRecord>& recordsOf(const Scenario& scenario);
 
-    /** The log channel's records of the scenario of that name. */
+    /** Returns the log channel's records of a scenario. */
     std::vector<LogRecord> logged(const std::string& scenarioName);
 
-    /** The names in those of a kind that come from a file. */
+    /** Returns the names in the records of a kind and a source file. */
     std::vector<std::string> namesOf(const std::string& scenarioName, Line::Kind kind, const std::string& file);
 };
 

@@ -7,12 +7,12 @@
 #include <set>
 #include <tuple>
 
-// The form of transcripts: both channels, texts, requests between rules, functions inside functions.
+// Format of transcripts: channels, messages, separators around requests, nesting of functions.
 
 namespace contract {
 namespace {
 
-TEST_F(TranscriptPropertyTest, EachRecordStandsOnTheLogAndAtOnceOnTheTrace) {
+TEST_F(TranscriptPropertyTest, EachLogRecordIsFollowedByTheSameTraceRecord) {
     forEachTranscript([](const Scenario&, const std::vector<LogRecord>& records) {
         ASSERT_EQ(records.size() % 2, 0U);
         for (std::size_t index = 0; index < records.size(); index += 2) {
@@ -25,12 +25,12 @@ TEST_F(TranscriptPropertyTest, EachRecordStandsOnTheLogAndAtOnceOnTheTrace) {
     });
 }
 
-TEST_F(TranscriptPropertyTest, EachTextHasOneOfTheForms) {
+TEST_F(TranscriptPropertyTest, EachMessageHasAKnownFormat) {
     forEachRecord(
         [](const LogRecord& record, const Line& line) { EXPECT_NE(line.kind, Line::unknown) << record.text; });
 }
 
-TEST_F(TranscriptPropertyTest, EachTextNamesTheFunctionFileAndLineOfItsRecord) {
+TEST_F(TranscriptPropertyTest, EachMessageContainsTheFunctionFileAndLineOfItsRecord) {
     forEachRecord([](const LogRecord& record, const Line& line) {
         if (record.file == markerFile) {
             return;
@@ -44,16 +44,16 @@ TEST_F(TranscriptPropertyTest, EachTextNamesTheFunctionFileAndLineOfItsRecord) {
     });
 }
 
-TEST_F(TranscriptPropertyTest, FunctionsAreNamedWithoutClassParametersAndTemplateArguments) {
+TEST_F(TranscriptPropertyTest, FunctionNamesHaveNoClassParametersOrTemplateArguments) {
     const std::regex plain("~?[A-Za-z_]+|operator(bool| bool|\\+\\+|<<|>>|=)");
     forEachRecord([&](const LogRecord& record, const Line&) {
         EXPECT_TRUE(std::regex_match(record.function, plain)) << record.function << " in " << record.file;
     });
 }
 
-TEST_F(TranscriptPropertyTest, EachRequestStandsBetweenTwoRules) {
+TEST_F(TranscriptPropertyTest, EachRequestIsEnclosedBySeparators) {
     forEachTranscript([](const Scenario& scenario, const std::vector<LogRecord>& records) {
-        std::string open;  // entry point of the request that the record before was in
+        std::string open;  // entry point of the current request
         const auto log = channel(records, "log");
         for (std::size_t index = 0; index < log.size(); ++index) {
             const Line line = lineOf(log[index].text);
@@ -86,13 +86,13 @@ TEST_F(TranscriptPropertyTest, EachRequestStandsBetweenTwoRules) {
     });
 }
 
-/** How many lines the source file of the entry points has. */
+/** Returns the number of lines of the entry points' source file. */
 int linesOfEntryUnit() {
     const std::string source = testsupport::readFile(ENTRY_UNIT_SOURCE);
     return static_cast<int>(std::count(source.begin(), source.end(), '\n'));
 }
 
-TEST_F(TranscriptPropertyTest, MarkersTellTheLineOfTheEntryPoint) {
+TEST_F(TranscriptPropertyTest, MarkersContainTheLineOfTheEntryPoint) {
     std::map<std::string, std::set<int>> linesOfEntryPoints;
     forEachTranscript([&](const Scenario&, const std::vector<LogRecord>& records) {
         int entryPointLine = 0;
@@ -118,7 +118,7 @@ TEST_F(TranscriptPropertyTest, MarkersTellTheLineOfTheEntryPoint) {
     EXPECT_LE(*all.rbegin(), linesOfEntryUnit());
 }
 
-TEST_F(TranscriptPropertyTest, CaughtExceptionsAreToldByTheEntryPointAtALineOfItsFile) {
+TEST_F(TranscriptPropertyTest, CaughtExceptionsAreLoggedByTheEntryPoint) {
     int caught = 0;
     forEachTranscript([&](const Scenario&, const std::vector<LogRecord>& records) {
         std::string entryPoint;
@@ -137,7 +137,7 @@ TEST_F(TranscriptPropertyTest, CaughtExceptionsAreToldByTheEntryPointAtALineOfIt
     EXPECT_GT(caught, 0);
 }
 
-TEST_F(TranscriptPropertyTest, MarkersAreFiledUnderTheTraceHeaderAndItsLines) {
+TEST_F(TranscriptPropertyTest, MarkersHaveTheFileAndLinesOfTheTraceHeader) {
     const std::map<int, std::string> functions{
         {336, "markProviderEntry"}, {337, "markProviderEntry"}, {348, "markProviderExit"}, {349, "markProviderExit"}};
     forEachRecord([&](const LogRecord& record, const Line&) {
@@ -158,14 +158,14 @@ public:
         open.push_back({line.file, line.name, record.line, false});
     }
 
-    /** A failure that leaves every open function, as far as anybody may know. */
+    /** Handles a failure, which may leave every open function. */
     void fail() {
         for (Function& each : open) {
             each.mayBeLeft = true;
         }
     }
 
-    /** Closes the innermost of that name; those inside it must have been left without notice. */
+    /** Closes the innermost function with that name. Functions inside it must have been left by an exception. */
     void exit(const Line& line) {
         while (!open.empty() && !(open.back().file == line.file && open.back().name == line.name)) {
             expectLeft(open.back());
@@ -210,7 +210,7 @@ TEST_F(TranscriptPropertyTest, EntriesAndExitsNest) {
     });
 }
 
-TEST_F(TranscriptPropertyTest, AnExitHasTheParameterListOfItsEntryWhenNoFunctionChangesIt) {
+TEST_F(TranscriptPropertyTest, AnExitRepeatsTheParameterListOfItsEntry) {
     const std::set<std::string> changing{"getProperty", "deleteCMPIInstance", "operator>>"};
     forEachTranscript([&](const Scenario&, const std::vector<LogRecord>& records) {
         std::vector<Line> open;

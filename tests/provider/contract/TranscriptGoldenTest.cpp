@@ -9,11 +9,11 @@
 #include <set>
 #include <sstream>
 
-// What each scenario logs, record by record, is what its golden file says.
+// Compares each scenario's log with its golden file.
 //
-// A line of a golden file is one record: channel, level, logger, function, file, line, text, with tabs between them.
-// Line numbers and addresses are masked, except the fixed lines of the records that mark a request's begin and end.
-// With UPDATE_GOLDEN=1 in the environment the files are written instead of compared.
+// A line of a golden file is one record: channel, level, logger, function, file, line and message, separated by tabs.
+// Line numbers and addresses are masked, except the fixed lines of the marker records of a request. Set UPDATE_GOLDEN=1
+// in the environment to write the files instead of comparing.
 
 namespace contract {
 namespace {
@@ -45,7 +45,7 @@ std::vector<std::string> linesOf(const std::string& content) {
     return lines;
 }
 
-/** Where two transcripts part, for people. */
+/** Returns the first difference between two transcripts, for readers. */
 std::string difference(const std::string& golden, const std::string& logged) {
     const auto expected = linesOf(golden);
     const auto actual = linesOf(logged);
@@ -74,7 +74,7 @@ std::string scenarioName(const testing::TestParamInfo<Scenario>& info) {
 
 INSTANTIATE_TEST_SUITE_P(Scenarios, TranscriptGoldenTest, testing::ValuesIn(scenarios()), scenarioName);
 
-TEST_P(TranscriptGoldenTest, IsLoggedRecordByRecord) {
+TEST_P(TranscriptGoldenTest, MatchesTheGoldenFile) {
     std::string logged;
     for (const LogRecord& record : transcriptOf(GetParam())) {
         logged += goldenLine(record);
@@ -89,7 +89,7 @@ TEST_P(TranscriptGoldenTest, IsLoggedRecordByRecord) {
     EXPECT_TRUE(golden == logged) << file.string() << "\n" << difference(golden, logged);
 }
 
-TEST(TranscriptGoldenFiles, BelongToScenarios) {
+TEST(TranscriptGoldenFiles, AllBelongToScenarios) {
     std::set<std::string> expected;
     for (const Scenario& scenario : scenarios()) {
         expected.insert(goldenFile(scenario).filename().string());

@@ -17,9 +17,9 @@ constexpr const char* agentClass = "VELKO_OstrelAgent";
 constexpr const char* assetsClass = "VELKO_AssetIDDetails";
 constexpr const char* unknownClass = "VELKO_NoSuchClass";
 
-/** All that a client may change of a record, and a property that it may not. */
-std::vector<NamedValue> changesOf(const Side& side) {
-    if (std::string(side.element) == leases.element) {
+/** Returns all modifiable properties of a record and a read-only one. */
+std::vector<NamedValue> changesOf(const AssociationKind& kind) {
+    if (std::string(kind.element) == leases.element) {
         return {named("Caption", text("not changeable")),
                 named("Lessor", text("Other Lessor")),
                 named("BaseTermCommencementDate", dateTime("20270101000000.000000+000")),
@@ -42,124 +42,136 @@ Instance changed(const ObjectPath& path, std::vector<NamedValue> properties) {
     return clientInstance(path, std::move(properties));
 }
 
-/** A scenario over records "A" of one side: what it does once they are loaded. */
-Scenario withRecord(const Side& side, const std::string& action,
-                    std::function<void(testsupport::ProviderLibrary&, const Side&)> act) {
-    return {std::string(side.element).substr(6) + "-" + action, [side, act](TranscriptTest& test) {
-                test.writeData(side.dataFile, recordFile(side, {"A"}));
-                act(test.begin(), side);
+/** Returns a scenario with loaded records "A" of one class. */
+Scenario withRecord(const AssociationKind& kind, const std::string& action,
+                    std::function<void(testsupport::ProviderLibrary&, const AssociationKind&)> act) {
+    return {std::string(kind.element).substr(6) + "-" + action, [kind, act](TranscriptTest& test) {
+                test.writeData(kind.dataFile, recordFile(kind, {"A"}));
+                act(test.begin(), kind);
             }};
 }
 
-/** The same, with a data file that cannot be opened any more. */
-Scenario unwritable(const Side& side, const std::string& action,
-                    std::function<void(testsupport::ProviderLibrary&, const Side&)> act) {
-    return {std::string(side.element).substr(6) + "-" + action + "-unwritable", [side, act](TranscriptTest& test) {
-                test.writeData(side.dataFile, recordFile(side, {"A"}));
+/** Returns the same with a data file that can no longer be opened. */
+Scenario unwritable(const AssociationKind& kind, const std::string& action,
+                    std::function<void(testsupport::ProviderLibrary&, const AssociationKind&)> act) {
+    return {std::string(kind.element).substr(6) + "-" + action + "-unwritable", [kind, act](TranscriptTest& test) {
+                test.writeData(kind.dataFile, recordFile(kind, {"A"}));
                 auto& provider = test.begin();
-                test.blockData(side.dataFile);
-                act(provider, side);
+                test.blockData(kind.dataFile);
+                act(provider, kind);
             }};
 }
 
 using Library = testsupport::ProviderLibrary;
 
-void enumerateNames(Library& provider, const Side& side) {
-    provider.enumerateInstanceNames(classPath(side.element));
+void enumerateNames(Library& provider, const AssociationKind& kind) {
+    provider.enumerateInstanceNames(classPath(kind.element));
 }
 
-void enumerate(Library& provider, const Side& side) {
-    provider.enumerateInstances(classPath(side.element));
+void enumerate(Library& provider, const AssociationKind& kind) {
+    provider.enumerateInstances(classPath(kind.element));
 }
 
 void create(Library& provider, const ObjectPath& path) {
     provider.createInstance(path, clientInstance(path, {}));
 }
 
-void modify(Library& provider, const Side& side, const std::string& identifier,
+void modify(Library& provider, const AssociationKind& kind, const std::string& identifier,
             const cimhost::PropertyList& properties = {}) {
-    const ObjectPath path = keyedPath(side.element, identifier);
-    provider.modifyInstance(path, changed(path, changesOf(side)), properties);
+    const ObjectPath path = keyedPath(kind.element, identifier);
+    provider.modifyInstance(path, changed(path, changesOf(kind)), properties);
 }
 
-/** A property list, which is traced and never applied. */
+/** A property list, which is traced but not applied. */
 const cimhost::PropertyList oneProperty(std::vector<std::string>{"Caption"});
 
-std::vector<Scenario> ofRecords(const Side& side) {
-    const std::string prefix = std::string(side.element).substr(6) + "-";
-    const auto with = [&](const char* action, auto act) { return withRecord(side, action, act); };
+std::vector<Scenario> ofRecords(const AssociationKind& kind) {
+    const std::string prefix = std::string(kind.element).substr(6) + "-";
+    const auto with = [&](const char* action, auto act) { return withRecord(kind, action, act); };
     return {
-        {prefix + "enumerate-none", [side](TranscriptTest& test) { enumerate(test.begin(), side); }},
+        {prefix + "enumerate-none", [kind](TranscriptTest& test) { enumerate(test.begin(), kind); }},
         with("enumerate-names", enumerateNames),
         with("enumerate", enumerate),
-        with("get", [](Library& p, const Side& s) { p.getInstance(keyedPath(s.element, "A")); }),
-        with("get-listed", [](Library& p, const Side& s) { p.getInstance(keyedPath(s.element, "A"), oneProperty); }),
-        with("get-absent", [](Library& p, const Side& s) { p.getInstance(keyedPath(s.element, "B")); }),
-        with("create", [](Library& p, const Side& s) { create(p, keyedPath(s.element, "B")); }),
-        {prefix + "create-first", [side](TranscriptTest& test) { create(test.begin(), keyedPath(side.element, "B")); }},
-        with("create-duplicate", [](Library& p, const Side& s) { create(p, keyedPath(s.element, "A")); }),
-        with("create-without-key", [](Library& p, const Side& s) { create(p, classPath(s.element)); }),
-        unwritable(side, "create", [](Library& p, const Side& s) { create(p, keyedPath(s.element, "B")); }),
-        with("modify", [](Library& p, const Side& s) { modify(p, s, "A"); }),
-        with("modify-listed", [](Library& p, const Side& s) { modify(p, s, "A", oneProperty); }),
-        with("modify-absent", [](Library& p, const Side& s) { modify(p, s, "B"); }),
-        with("delete", [](Library& p, const Side& s) { p.deleteInstance(keyedPath(s.element, "A")); }),
-        with("delete-absent", [](Library& p, const Side& s) { p.deleteInstance(keyedPath(s.element, "B")); }),
-        with("delete-without-key", [](Library& p, const Side& s) { p.deleteInstance(classPath(s.element)); }),
-        unwritable(side, "delete", [](Library& p, const Side& s) { p.deleteInstance(keyedPath(s.element, "A")); }),
+        with("get", [](Library& p, const AssociationKind& s) { p.getInstance(keyedPath(s.element, "A")); }),
+        with("get-listed",
+             [](Library& p, const AssociationKind& s) { p.getInstance(keyedPath(s.element, "A"), oneProperty); }),
+        with("get-absent", [](Library& p, const AssociationKind& s) { p.getInstance(keyedPath(s.element, "B")); }),
+        with("create", [](Library& p, const AssociationKind& s) { create(p, keyedPath(s.element, "B")); }),
+        {prefix + "create-first", [kind](TranscriptTest& test) { create(test.begin(), keyedPath(kind.element, "B")); }},
+        with("create-duplicate", [](Library& p, const AssociationKind& s) { create(p, keyedPath(s.element, "A")); }),
+        with("create-without-key", [](Library& p, const AssociationKind& s) { create(p, classPath(s.element)); }),
+        unwritable(kind, "create", [](Library& p, const AssociationKind& s) { create(p, keyedPath(s.element, "B")); }),
+        with("modify", [](Library& p, const AssociationKind& s) { modify(p, s, "A"); }),
+        with("modify-listed", [](Library& p, const AssociationKind& s) { modify(p, s, "A", oneProperty); }),
+        with("modify-absent", [](Library& p, const AssociationKind& s) { modify(p, s, "B"); }),
+        with("delete", [](Library& p, const AssociationKind& s) { p.deleteInstance(keyedPath(s.element, "A")); }),
+        with("delete-absent",
+             [](Library& p, const AssociationKind& s) { p.deleteInstance(keyedPath(s.element, "B")); }),
+        with("delete-without-key",
+             [](Library& p, const AssociationKind& s) { p.deleteInstance(classPath(s.element)); }),
+        unwritable(kind, "delete",
+                   [](Library& p, const AssociationKind& s) { p.deleteInstance(keyedPath(s.element, "A")); }),
     };
 }
 
-/** A scenario over an association: the records are "/system/computer", the computer's own, and "B". */
-Scenario ofAssociation(const Side& side, const std::string& action, const std::vector<std::string>& computers,
-                       std::function<void(Library&, const Side&)> act) {
-    return {std::string(side.association).substr(6) + "-" + action, [side, computers, act](TranscriptTest& test) {
-                test.writeData(side.dataFile, recordFile(side, {ofAlpha, "B"}));
+/** Returns a scenario of an association with the records "/system/computer", the computer's own, and "B". */
+Scenario ofAssociation(const AssociationKind& kind, const std::string& action,
+                       const std::vector<std::string>& computers,
+                       std::function<void(Library&, const AssociationKind&)> act) {
+    return {std::string(kind.association).substr(6) + "-" + action, [kind, computers, act](TranscriptTest& test) {
+                test.writeData(kind.dataFile, recordFile(kind, {ofAlpha, "B"}));
                 test.knowComputers(computers);
-                act(test.begin(), side);
+                act(test.begin(), kind);
             }};
 }
 
-cimhost::AssociationFilter through(const Side& side) {
-    return {side.association, {}, {}, {}};
+cimhost::AssociationFilter through(const AssociationKind& kind) {
+    return {kind.association, {}, {}, {}};
 }
 
-std::function<void(Library&, const Side&)> namesFrom(std::function<ObjectPath(const Side&)> source) {
-    return [source](Library& provider, const Side& side) { provider.associatorNames(source(side), through(side)); };
+std::function<void(Library&, const AssociationKind&)> namesFrom(
+    std::function<ObjectPath(const AssociationKind&)> source) {
+    return [source](Library& provider, const AssociationKind& kind) {
+        provider.associatorNames(source(kind), through(kind));
+    };
 }
 
-std::function<void(Library&, const Side&)> instancesFrom(std::function<ObjectPath(const Side&)> source,
-                                                         const cimhost::PropertyList& properties = {}) {
-    return [=](Library& provider, const Side& side) { provider.associators(source(side), through(side), properties); };
+std::function<void(Library&, const AssociationKind&)> instancesFrom(
+    std::function<ObjectPath(const AssociationKind&)> source, const cimhost::PropertyList& properties = {}) {
+    return [=](Library& provider, const AssociationKind& kind) {
+        provider.associators(source(kind), through(kind), properties);
+    };
 }
 
-ObjectPath theComputer(const Side&) {
+ObjectPath theComputer(const AssociationKind&) {
     return computerPath("testhost");
 }
 
-ObjectPath theElement(const Side& side) {
-    return keyedPath(side.element, ofAlpha);
+ObjectPath theElement(const AssociationKind& kind) {
+    return keyedPath(kind.element, ofAlpha);
 }
 
-ObjectPath computerWithoutName(const Side&) {
+ObjectPath computerWithoutName(const AssociationKind&) {
     return testsupport::objectPath(nameSpace, "VELKO_ComputerSystem", {named("SystemName", text("testhost"))});
 }
 
-std::vector<Scenario> ofAssociations(const Side& side) {
+std::vector<Scenario> ofAssociations(const AssociationKind& kind) {
     const auto of = [&](const char* action, const std::vector<std::string>& computers, auto act) {
-        return ofAssociation(side, action, computers, act);
+        return ofAssociation(kind, action, computers, act);
     };
-    const auto list = [](Library& p, const Side& s) { p.enumerateInstanceNames(classPath(s.association)); };
-    const auto listInstances = [](Library& p, const Side& s) { p.enumerateInstances(classPath(s.association)); };
+    const auto list = [](Library& p, const AssociationKind& s) { p.enumerateInstanceNames(classPath(s.association)); };
+    const auto listInstances = [](Library& p, const AssociationKind& s) {
+        p.enumerateInstances(classPath(s.association));
+    };
     return {
         of("enumerate-names", {"testhost"}, list),
         of("enumerate", {"testhost"}, listInstances),
         of("enumerate-listed", {"testhost"},
-           [](Library& p, const Side& s) { p.enumerateInstances(classPath(s.association), oneProperty); }),
+           [](Library& p, const AssociationKind& s) { p.enumerateInstances(classPath(s.association), oneProperty); }),
         of("enumerate-names-two-computers", {"testhost", "second"}, list),
         of("enumerate-names-no-computer", {}, list),
         of("get", {"testhost"},
-           [](Library& p, const Side& s) {
+           [](Library& p, const AssociationKind& s) {
                p.getInstance(testsupport::objectPath(nameSpace, s.association,
                                                      {named("Antecedent", testsupport::reference(computerPath())),
                                                       named("Dependent", testsupport::reference(theElement(s)))}));
@@ -167,9 +179,10 @@ std::vector<Scenario> ofAssociations(const Side& side) {
         of("names-from-computer", {"testhost"}, namesFrom(theComputer)),
         of("from-computer", {"testhost"}, instancesFrom(theComputer)),
         of("from-computer-listed", {"testhost"}, instancesFrom(theComputer, oneProperty)),
-        of("names-from-unknown-computer", {"testhost"}, namesFrom([](const Side&) { return computerPath("other"); })),
+        of("names-from-unknown-computer", {"testhost"},
+           namesFrom([](const AssociationKind&) { return computerPath("other"); })),
         of("names-from-computer-class", {"testhost"},
-           namesFrom([](const Side&) { return classPath("VELKO_ComputerSystem"); })),
+           namesFrom([](const AssociationKind&) { return classPath("VELKO_ComputerSystem"); })),
         of("names-from-computer-without-name", {"testhost"}, namesFrom(computerWithoutName)),
         of("names-from-element", {"testhost", "second"}, namesFrom(theElement)),
         of("from-element", {"testhost", "second"}, instancesFrom(theElement)),
@@ -177,12 +190,12 @@ std::vector<Scenario> ofAssociations(const Side& side) {
         of("names-from-element-one-computer", {"testhost"}, namesFrom(theElement)),
         of("names-from-element-no-computer", {}, namesFrom(theElement)),
         of("names-from-element-without-place", {"testhost", "second"},
-           namesFrom([](const Side& s) { return keyedPath(s.element, "B"); })),
-        of("names-from-element-without-identifier", {"testhost", "second"}, namesFrom([](const Side& s) {
+           namesFrom([](const AssociationKind& s) { return keyedPath(s.element, "B"); })),
+        of("names-from-element-without-identifier", {"testhost", "second"}, namesFrom([](const AssociationKind& s) {
                return testsupport::objectPath(nameSpace, s.element, {named("Other", text("B"))});
            })),
         of("names-from-other-element", {"testhost", "second"},
-           namesFrom([](const Side& s) { return keyedPath(s.otherElement, ofAlpha); })),
+           namesFrom([](const AssociationKind& s) { return keyedPath(s.otherElement, ofAlpha); })),
     };
 }
 
@@ -241,7 +254,7 @@ std::vector<Scenario> ofProducts() {
     };
 }
 
-/** Every dispatched operation on a class that the provider does not know. */
+/** Makes every dispatched request with an unknown class. */
 void allOnUnknownClass(Library& provider) {
     const ObjectPath path = classPath(unknownClass);
     const cimhost::AssociationFilter filter{unknownClass, {}, {}, {}};

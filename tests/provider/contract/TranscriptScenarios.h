@@ -12,24 +12,24 @@ namespace contract {
 
 class TranscriptTest;
 
-/** One thing that clients do, of which the log is looked at. */
+/** A client's actions whose log is compared. */
 struct Scenario {
-    std::string name;  ///< also of its golden file
+    std::string name;  ///< also the name of its golden file
     std::function<void(TranscriptTest&)> run;
-    bool isRequest = true;  ///< whether everything logged belongs to requests that are dispatched by class
+    bool isRequest = true;  ///< whether all records belong to requests that are dispatched by class
 };
 
 inline std::ostream& operator<<(std::ostream& stream, const Scenario& scenario) {
     return stream << scenario.name;
 }
 
-/** All of them: every operation of every class, failing ones too, and what is logged outside of requests. */
+/** Returns all scenarios: every operation of every class, including failures, and logging outside of requests. */
 const std::vector<Scenario>& scenarios();
 
-/** A provider whose log is looked at. */
+/** A provider whose log is recorded. */
 class TranscriptTest : public ProviderTest {
 public:
-    /** Starts a scenario anew and gives what it logged, both channels, in order. */
+    /** Runs a scenario and returns its records, both channels, in order. */
     std::vector<LogRecord> transcriptOf(const Scenario& scenario);
 
     /** @name For scenarios */
@@ -39,10 +39,10 @@ public:
     using ProviderTest::unload;
     using ProviderTest::writeData;
 
-    /** The scenario's preparations are over: loads the provider; what has been logged so far does not count. */
+    /** Loads the provider after a scenario's preparations. Drops the records logged so far. */
     testsupport::ProviderLibrary& begin();
 
-    /** The computer systems that the object manager knows. */
+    /** Sets the computer systems of the object manager. */
     void knowComputers(const std::vector<std::string>& names);
     ///@}
 };

@@ -8,7 +8,7 @@
 #include <set>
 #include <sstream>
 
-// The source that the line number of a record belongs to, as docs/log-records.md has it.
+// The sources that the line numbers of records belong to, as documented in docs/log-records.md.
 
 namespace contract {
 namespace {
@@ -20,8 +20,8 @@ const fs::path root = fs::path(CONTRACT_GOLDEN) / "../../../..";
 /** A row of the table "Sources of line numbers". */
 struct SourceRow {
     std::set<std::string> files;
-    std::string source;               ///< path below the root; empty for the record's file itself
-    std::set<std::string> functions;  ///< those named
+    std::string source;               ///< path relative to the root; empty for the record's file
+    std::set<std::string> functions;  ///< documented functions
     bool hasAllOthers;
 };
 
@@ -70,7 +70,7 @@ fs::path sourceNamed(const std::string& file) {
     return {};
 }
 
-/** The sources that the document names for a function: more than one where the type of a value decides. */
+/** Returns the documented sources for a function: more than one if the type of a value determines it. */
 std::vector<fs::path> documentedSources(const std::vector<SourceRow>& rows, const LogRecord& record) {
     std::vector<fs::path> named;
     std::vector<fs::path> others;
@@ -90,7 +90,7 @@ std::vector<fs::path> documentedSources(const std::vector<SourceRow>& rows, cons
     return named.empty() ? others : named;
 }
 
-/** Whether a line of a source states the place of a record. */
+/** Returns whether a line of a source sets the position of a record. */
 bool reportsAt(const fs::path& source, int line) {
     static std::map<fs::path, std::vector<std::string>> known;
     static const std::regex place(R"(\b(at|here)\()");
@@ -102,7 +102,7 @@ bool reportsAt(const fs::path& source, int line) {
     return index < lines.size() && std::regex_search(lines[index], place);
 }
 
-TEST_F(TranscriptPropertyTest, EachLineNumberIsThatOfAStatementInTheDocumentedSource) {
+TEST_F(TranscriptPropertyTest, EachLineNumberBelongsToATraceStatementInTheDocumentedSource) {
     const auto rows = documentedRows();
     ASSERT_GE(rows.size(), 9U);
     std::set<std::string> headersSeen;

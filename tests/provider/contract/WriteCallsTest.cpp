@@ -10,12 +10,12 @@
 
 #include <sstream>
 
-// What a rewrite asks of the system for each line of the record file: seen are all functions of the C library by which
-// an open file is written, or something else is done with it.
+// System calls of a rewrite per line of the record file. Records all C library functions that write to or use an open
+// file.
 
 namespace {
 
-/** The calls for a file, as long as this lives. There is one at a time. */
+/** Records the calls for a file while it exists. Only one instance may exist. */
 class Watch {
 public:
     explicit Watch(const std::filesystem::path& itsFile) : file(std::filesystem::canonical(itsFile).string()) {
@@ -25,7 +25,7 @@ public:
     Watch(const Watch&) = delete;
     Watch& operator=(const Watch&) = delete;
 
-    /** The watch over the file behind a descriptor; null for none. */
+    /** Returns the watch of the descriptor's file; null for none. */
     static Watch* over(int descriptor) {
         if (only == nullptr) {
             return nullptr;
@@ -35,8 +35,8 @@ public:
         return !error && name == only->file ? only : nullptr;
     }
 
-    std::vector<std::string> written{};  ///< what each call wrote
-    std::size_t others = 0;              ///< calls that do not write
+    std::vector<std::string> written{};  ///< data of each write call
+    std::size_t others = 0;              ///< number of other calls
 
 private:
     static inline Watch* only = nullptr;
@@ -45,7 +45,7 @@ private:
 
 }  // namespace
 
-// They take the place of the system's own in all libraries of this process.
+// Interpose the functions of the C library for all libraries of this process.
 #pragma GCC visibility push(default)
 extern "C" {
 
@@ -68,8 +68,8 @@ ssize_t writev(int descriptor, const struct iovec* parts, int count) {
 }
 
 /**
- * Another function for an open file, of the system call of that number. Under a name of its own in this source, which
- * spares it the parameters and qualifiers of the C library's declaration.
+ * Defines another function for an open file that makes the system call with that number. The function has a different
+ * name in this source, so that it need not match the C library's declaration.
  */
 #define COUNTED(name, number)                                                                             \
     long counted_##name(int descriptor, long first, long second, long third, long fourth) __asm__(#name); \
@@ -80,7 +80,7 @@ ssize_t writev(int descriptor, const struct iovec* parts, int count) {
         return syscall(number, descriptor, first, second, third, fourth);                                 \
     }
 
-// CMakeLists.txt has the same names.
+// Keep consistent with CMakeLists.txt.
 COUNTED(close, SYS_close)
 COUNTED(dup, SYS_dup)
 COUNTED(fallocate, SYS_fallocate)
@@ -117,7 +117,7 @@ using testsupport::text;
 
 class WriteCallsTest : public RecordTest {
 protected:
-    /** Makes so many records and changes one. @return the calls other than to write */
+    /** Creates a number of records and changes one. @return the number of calls other than write */
     std::size_t othersOfChange(int records) {
         std::vector<std::string> identifiers;
         for (int number = 0; number < records; ++number) {
@@ -142,14 +142,14 @@ protected:
 
 INSTANTIATE_RECORD_TEST(WriteCallsTest);
 
-TEST_P(WriteCallsTest, ARewriteDoesOneWriteCallALineAndNothingElseALine) {
+TEST_P(WriteCallsTest, ARewriteMakesOneWriteCallPerLine) {
     const std::size_t ofFew = othersOfChange(2);
     EXPECT_EQ(linesOfFile().size(), 1 + 2 * kind().linesOfRecord);
     EXPECT_EQ(othersOfChange(20), ofFew);
     EXPECT_EQ(linesOfFile().size(), 1 + 22 * kind().linesOfRecord);
 }
 
-TEST(WriteCallsWatchTest, SeesWhatIsDoneBesideWriting) {
+TEST(WriteCallsWatchTest, RecordsOtherCallsThanWriting) {
     const testsupport::TempDirectory directory;
     const std::filesystem::path path = directory.path() / "file";
     const int file = open(path.c_str(), O_RDWR | O_CREAT | O_CLOEXEC, 0600);

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "ElementSides.h"
+#include "ElementKinds.h"
 #include "KO/Moniker.h"
 #include "LeaseSetting.h"
 #include "WarrantySetting.h"
@@ -10,16 +10,16 @@
 #include <utility>
 #include <vector>
 
-/** The two setting elements as the typed tests see them. */
+/** Parameters of typed tests: the two setting elements. */
 namespace providerTest {
 
 using KO::FrameworkException;
 using KO::Moniker;
 using Keys = std::vector<std::pair<std::string, std::string>>;
 
-struct LeaseSettingSide {
+struct LeaseSettingKind {
     using Setting = KO::LeaseWarrantyProvider::LeaseSetting;
-    using Store = LeaseSide;
+    using Store = LeaseKind;
 
     static constexpr const char* sourceFile = "LeaseSetting.cpp";
     static constexpr const char* elementFile = "Lease.cpp";
@@ -30,9 +30,9 @@ struct LeaseSettingSide {
     static Moniker elementMoniker(Setting& setting, Moniker& computer) { return setting.getLeaseMoniker(computer); }
 };
 
-struct WarrantySettingSide {
+struct WarrantySettingKind {
     using Setting = KO::LeaseWarrantyProvider::WarrantySetting;
-    using Store = WarrantySide;
+    using Store = WarrantyKind;
 
     static constexpr const char* sourceFile = "WarrantySetting.cpp";
     static constexpr const char* elementFile = "Warranty.cpp";
@@ -43,7 +43,7 @@ struct WarrantySettingSide {
     static Moniker elementMoniker(Setting& setting, Moniker& computer) { return setting.getWarrantyMoniker(computer); }
 };
 
-using SettingSides = testing::Types<LeaseSettingSide, WarrantySettingSide>;
+using SettingKinds = testing::Types<LeaseSettingKind, WarrantySettingKind>;
 
 inline Moniker moniker(const Keys& keys) {
     Moniker made;
@@ -63,13 +63,13 @@ inline Keys keysOf(Moniker moniker) {
     return keys;
 }
 
-/** A setting element over empty stores, and its operations on keys. */
-template <class Side>
-class SettingElement : public RecordStore<typename Side::Store> {
+/** A setting element over empty stores, with operations on keys. */
+template <class Kind>
+class SettingElement : public RecordStore<typename Kind::Store> {
 protected:
     Keys toElement(const Keys& computer) {
         Moniker argument = moniker(computer);
-        return keysOf(Side::elementMoniker(setting, argument));
+        return keysOf(Kind::elementMoniker(setting, argument));
     }
 
     Keys toComputer(const Keys& element) {
@@ -77,8 +77,8 @@ protected:
         return keysOf(setting.getComputerMoniker(argument));
     }
 
-    std::unique_ptr<typename Side::Setting> owner = std::make_unique<typename Side::Setting>();
-    typename Side::Setting& setting = *owner;
+    std::unique_ptr<typename Kind::Setting> owner = std::make_unique<typename Kind::Setting>();
+    typename Kind::Setting& setting = *owner;
 };
 
 }  // namespace providerTest

@@ -1,14 +1,14 @@
 #pragma once
 
 #include "Lease.h"
-#include "Sides.h"
+#include "RecordKinds.h"
 #include "Warranty.h"
 
-/** The two elements over record stores as the typed tests see them. */
+/** Parameters of typed tests: the two elements over record stores. */
 namespace providerTest {
 
-struct LeaseElementSide {
-    using Store = LeaseSide;
+struct LeaseElementKind {
+    using Store = LeaseKind;
     using Element = KO::LeaseWarrantyProvider::Lease;
 
     static constexpr const char* sourceFile = "Lease.cpp";
@@ -16,8 +16,8 @@ struct LeaseElementSide {
     static void remove(Element& element) { element.removeLease(); }
 };
 
-struct WarrantyElementSide {
-    using Store = WarrantySide;
+struct WarrantyElementKind {
+    using Store = WarrantyKind;
     using Element = KO::LeaseWarrantyProvider::Warranty;
 
     static constexpr const char* sourceFile = "Warranty.cpp";
@@ -25,6 +25,6 @@ struct WarrantyElementSide {
     static void remove(Element& element) { element.removeWarranty(); }
 };
 
-using ElementSides = testing::Types<LeaseElementSide, WarrantyElementSide>;
+using ElementKinds = testing::Types<LeaseElementKind, WarrantyElementKind>;
 
 }  // namespace providerTest

@@ -1,4 +1,4 @@
-#include "Scene.h"
+#include "TestEnvironment.h"
 
 #include <unistd.h>
 
@@ -45,14 +45,14 @@ std::string assetContent() {
     return content;
 }
 
-/** What the libraries under test need of others stays: they come and go many times. */
-void keepOthersLoaded() {
+/** Keeps a dependency of the libraries under test loaded, since they are loaded and unloaded many times. */
+void keepDependenciesLoaded() {
     static void* const kept = dlopen("libsystemd.so.0", RTLD_NOW);
     (void)kept;
 }
 
-/** In memory where there is such a folder: thousands of files are written anew. */
-fs::path quickFolder() {
+/** Returns a directory in memory if there is one, since the tests write thousands of files. */
+fs::path fastDirectory() {
     constexpr const char* inMemory = "/dev/shm";
     return access(inMemory, W_OK | X_OK) == 0 ? fs::path(inMemory) : fs::temp_directory_path();
 }
@@ -73,19 +73,19 @@ std::string warrantyRecords(int count) {
     });
 }
 
-std::string fileOf(Scene::Library library) {
-    return testsupport::underTest(library == Scene::Library::provider ? PROVIDER_LIBRARY : GATE_LIBRARY);
+std::string fileOf(TestEnvironment::Library library) {
+    return testsupport::underTest(library == TestEnvironment::Library::provider ? PROVIDER_LIBRARY : GATE_LIBRARY);
 }
 
-Scene::Scene(Library itsLibrary)
-    : folder(quickFolder()),
+TestEnvironment::TestEnvironment(Library itsLibrary)
+    : folder(fastDirectory()),
       first{{leaseFile, leaseRecords(recordsAtFirst)},
             {warrantyFile, warrantyRecords(recordsAtFirst)},
             {assetFile, assetContent()}},
       kind(itsLibrary) {
-    keepOthersLoaded();
+    keepDependenciesLoaded();
     configure({});
-    setAbsentDirectory("/var/lib/ostrel/");  // where the agent looks without a configuration
+    setAbsentDirectory("/var/lib/ostrel/");  // default directory of the agent's configuration
     setenv("OSTREL_CONFIG", configuration().c_str(), 1);
     const cimhost::ObjectPath computer = testsupport::objectPath(
         "root/cimv2", "VELKO_ComputerSystem", {testsupport::named("Name", testsupport::text("testhost"))});
@@ -94,12 +94,12 @@ Scene::Scene(Library itsLibrary)
     restart();
 }
 
-Scene::~Scene() {
+TestEnvironment::~TestEnvironment() {
     unload();
     unsetenv("OSTREL_CONFIG");
 }
 
-void Scene::configure(const std::string& log, System system) {
+void TestEnvironment::configure(const std::string& log, System system) {
     const std::string systemNode = R"([[instrumentation.node]]
 type = 1
 path = "/system"
@@ -117,7 +117,7 @@ vendor = "VEL"
 )" + log + R"(
 [instrumentation]
 discover = false
-)" + (system == System::told ? systemNode : std::string()) +
+)" + (system == System::present ? systemNode : std::string()) +
                                                 R"(
 [[instrumentation.node]]
 type = 40
@@ -126,11 +126,11 @@ properties = { "36" = "Example Maker", "39" = "Model X - Tower", "108" = "testho
 )");
 }
 
-void Scene::restart() {
+void TestEnvironment::restart() {
     restart(first);
 }
 
-void Scene::restart(const FileContents& files) {
+void TestEnvironment::restart(const FileContents& files) {
     unload();
     fs::remove_all(dataDirectory());
     fs::create_directory(dataDirectory());
@@ -139,7 +139,7 @@ void Scene::restart(const FileContents& files) {
     }
 }
 
-testsupport::ProviderLibrary& Scene::library() {
+testsupport::ProviderLibrary& TestEnvironment::library() {
     if (loaded == nullptr) {
         const char* name = kind == Library::provider ? "LeaseAndWarrantyProvider" : "LeaseAndWarrantyGate";
         loaded = std::make_unique<testsupport::ProviderLibrary>(fileOf(kind), name, broker);
@@ -147,30 +147,30 @@ testsupport::ProviderLibrary& Scene::library() {
     return *loaded;
 }
 
-void Scene::unload() {
+void TestEnvironment::unload() {
     loaded.reset();
 }
 
-Done Scene::ask(const Request& request, const Fault* fault) {
+Response TestEnvironment::ask(const Request& request, const Fault* fault) {
     testsupport::ProviderLibrary& provider = library();
     CMPIInstanceMI* instances = provider.instanceMI();
     CMPIAssociationMI* associations = provider.associationMI();
-    Done done;
+    Response response;
     broker.forget();
     const int openBefore = openDescriptors();
-    done.outcome = provider.call([&](auto& scope, const CMPIContext* context, const CMPIResult* result) {
+    response.outcome = provider.call([&](auto& scope, const CMPIContext* context, const CMPIResult* result) {
         const Arguments arguments{
             instances, associations, context, result, scope.objectPath(request.path), scope.instance(request.instance)};
-        const Armed armed = fault == nullptr ? Armed() : Armed(*fault);
+        const FaultInjection injection = fault == nullptr ? FaultInjection() : FaultInjection(*fault);
         const CMPIStatus status = request.call(arguments);
-        done.counts = armed.counts();
+        response.counts = injection.counts();
         return status;
     });
-    done.leftOpen = openDescriptors() - openBefore;
-    return done;
+    response.leakedDescriptors = openDescriptors() - openBefore;
+    return response;
 }
 
-Lines Scene::instancesOf(const std::string& className) {
+Lines TestEnvironment::instancesOf(const std::string& className) {
     const cimhost::ObjectPath path = testsupport::objectPath("root/cimv2", className);
     Lines lines;
     for (const cimhost::Instance& instance : library().enumerateInstances(path).instances()) {
@@ -183,7 +183,7 @@ Lines Scene::instancesOf(const std::string& className) {
     return lines;
 }
 
-FileContents Scene::files() const {
+FileContents TestEnvironment::files() const {
     FileContents contents;
     if (fs::exists(dataDirectory())) {
         for (const auto& entry : fs::directory_iterator(dataDirectory())) {

@@ -11,7 +11,7 @@
 #include <utility>
 #include <vector>
 
-/** The two record stores as the typed tests see them. */
+/** Parameters of typed tests: the two record stores. */
 namespace providerTest {
 
 using KO::InstrumentationException;
@@ -29,7 +29,7 @@ struct Line {
     std::size_t line;
 };
 
-struct LeaseSide {
+struct LeaseKind {
     using Base = LeaseBase;
     using Cache = LeaseCache;
     using Unit = LeaseUnit;
@@ -69,7 +69,7 @@ struct LeaseSide {
     }
 };
 
-struct WarrantySide {
+struct WarrantyKind {
     using Base = WarrantyBase;
     using Cache = WarrantyCache;
     using Unit = WarrantyUnit;
@@ -98,19 +98,19 @@ struct WarrantySide {
     }
 };
 
-using Sides = testing::Types<LeaseSide, WarrantySide>;
+using RecordKinds = testing::Types<LeaseKind, WarrantyKind>;
 
-struct SideNames {
-    template <class Side>
+struct KindNames {
+    template <class Kind>
     static std::string GetName(int number) {
-        return number == 0 ? LeaseSide::name : WarrantySide::name;
+        return number == 0 ? LeaseKind::name : WarrantyKind::name;
     }
 };
 
-/** The texts of a side's exceptions and names, which differ in one word. */
-template <class Side>
+/** Messages and names of a kind of record, which differ in one word. */
+template <class Kind>
 struct Words {
-    static std::string with(const std::string& before, const std::string& after) { return before + Side::name + after; }
+    static std::string with(const std::string& before, const std::string& after) { return before + Kind::name + after; }
 
     inline static const std::string fileName = with("", ".dat");
     inline static const std::string sourceFile = with("", "Base.cpp");
@@ -121,13 +121,13 @@ struct Words {
     inline static const std::string cannotOpen = with("Could not open ", " record.");
 };
 
-/** A store with an empty table and no file, for each side. */
-template <class Side>
+/** A store with an empty table and no file, for each kind of record. */
+template <class Kind>
 class RecordStore : public CleanAgent {
 protected:
-    using Base = typename Side::Base;
-    using Cache = typename Side::Cache;
-    using Unit = typename Side::Unit;
+    using Base = typename Kind::Base;
+    using Cache = typename Kind::Cache;
+    using Unit = typename Kind::Unit;
 
     void SetUp() override {
         CleanAgent::SetUp();
@@ -143,10 +143,10 @@ protected:
         count() = 0;
     }
 
-    static std::vector<Unit>& table() { return Side::cache().table; }
-    static unsigned int& count() { return Side::count(Side::cache()); }
+    static std::vector<Unit>& table() { return Kind::cache().table; }
+    static unsigned int& count() { return Kind::count(Kind::cache()); }
 
-    /** Puts records in use into the table, without writing the file. */
+    /** Appends records in use to the table without writing the file. */
     static void fill(const std::vector<std::string>& identifiers) {
         for (const std::string& identifier : identifiers) {
             table().push_back(Unit(identifier));
@@ -161,44 +161,44 @@ protected:
 
     static std::string identifier(const Base& base) {
         std::string text;
-        base.getProperty(Side::Property::InstanceID, text);
+        base.getProperty(Kind::Property::InstanceID, text);
         return text;
     }
 
-    /** Whether the cursor is at the end. Unlike the cursor's own operator, moves nothing. */
+    /** Returns whether the cursor is at the end. Unlike the cursor's operator bool, does not move it. */
     static bool atEnd(const Base& base) {
         std::string text;
-        return !thrown<InstrumentationException>([&] { base.getProperty(Side::Property::InstanceID, text); }).empty();
+        return !thrown<InstrumentationException>([&] { base.getProperty(Kind::Property::InstanceID, text); }).empty();
     }
 
-    static std::filesystem::path path() { return agentEnvironment::dataDirectory() / Words<Side>::fileName; }
+    static std::filesystem::path path() { return agentEnvironment::dataDirectory() / Words<Kind>::fileName; }
     static std::string file() { return contentOf(path()); }
 
-    /** Loads a file of that content. */
+    /** Loads a file with that content. */
     static std::unique_ptr<Cache> load(const std::string& content) {
         write(path(), content);
         return std::make_unique<Cache>();
     }
 
-    /** What the store writes for one record, without the count line. */
+    /** Returns the lines that the store writes for one record, without the count. */
     static std::string written(const Unit& unit) {
         Cache cache;
         cache.table = {unit};
-        Side::count(cache) = 1;
+        Kind::count(cache) = 1;
         cache.flushCache();
         const std::string content = file();
         EXPECT_EQ(content.substr(0, 2), "1\n");
         return content.substr(2);
     }
 
-    /** What comes back of a record that was written. */
+    /** Returns a record that was written and read back. */
     static Unit reread(const Unit& unit) {
         const auto cache = load("1\n" + written(unit));
         return cache->table.at(0);
     }
 };
 
-/** The lines of a text. Each must be ended by a line feed. */
+/** Splits a string into lines. Each line must end with a line feed. */
 inline std::vector<std::string> linesOf(const std::string& text) {
     std::vector<std::string> lines;
     std::string line;

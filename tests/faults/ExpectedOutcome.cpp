@@ -1,4 +1,4 @@
-#include "Course.h"
+#include "ExpectedOutcome.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -24,7 +24,7 @@ using cimhost::ResultEvent;
 using cimhost::ResultEvents;
 using testing::AnyOf;
 
-/** The fixed keys of asset.dat, in the order in which they are read. */
+/** The fixed keys of asset.dat in the order in which they are read. */
 constexpr std::array<const char*, 11> readInOrder{
     "AssetNumber",     "AssetIdTag",   "Name",     "Phone",       "Position",       "Department",
     "LastInventoried", "PurchaseDate", "Location", "ZOPMProfile", "ZOPMUpdateTime",
@@ -54,7 +54,7 @@ bool isPartOf(const ResultEvent& event, const ResultEvent& whole) {
            isPartOf(instance->properties, wholeInstance->properties);
 }
 
-/** In the same order, with gaps. */
+/** Returns whether the events appear in `whole` in the same order, possibly with gaps. */
 bool isPartOf(const ResultEvents& events, const ResultEvents& whole) {
     auto from = whole.begin();
     return std::all_of(events.begin(), events.end(), [&](const ResultEvent& event) {
@@ -78,20 +78,20 @@ std::string described(const ResultEvents& events) {
     return text;
 }
 
-/** A directory in its place. */
+/** Replaces the file by a directory. */
 void makeUnreadable(const fs::path& file) {
     fs::remove(file);
     fs::create_directory(file);
 }
 
-void askWithoutAsset(Scene& scene, const Request& request, Course& course) {
-    scene.restart();
-    makeUnreadable(scene.dataDirectory() / assetFile);
-    course.withoutAsset = scene.ask(request).outcome;
-    scene.unload();
-    scene.configure({}, Scene::System::untold);
-    course.withoutSystem = scene.ask(request).outcome;
-    scene.configure({});
+void runWithoutAsset(TestEnvironment& environment, const Request& request, ExpectedOutcome& expected) {
+    environment.restart();
+    makeUnreadable(environment.dataDirectory() / assetFile);
+    expected.withoutAsset = environment.ask(request).outcome;
+    environment.unload();
+    environment.configure({}, TestEnvironment::System::absent);
+    expected.withoutSystem = environment.ask(request).outcome;
+    environment.configure({});
 }
 
 Lines linesOf(const std::string& content) {
@@ -105,48 +105,48 @@ Lines linesOf(const std::string& content) {
 
 }  // namespace
 
-Course undisturbed(Scene& scene, const Request& request) {
-    Course course;
-    course.file = request.changes != nullptr ? request.changes : leaseFile;
+ExpectedOutcome runWithoutFaults(TestEnvironment& environment, const Request& request) {
+    ExpectedOutcome expected;
+    expected.file = request.changes != nullptr ? request.changes : leaseFile;
     if (request.path.className == classOf(assetFile)) {
-        askWithoutAsset(scene, request, course);
+        runWithoutAsset(environment, request, expected);
     }
-    scene.restart();
-    course.before = scene.instancesOf(classOf(course.file));
-    course.fileBefore = scene.filesAtFirst().at(course.file);
-    course.done = scene.ask(request);
-    course.after = scene.instancesOf(classOf(course.file));
-    course.fileAfter = scene.files().at(course.file);
-    return course;
+    environment.restart();
+    expected.before = environment.instancesOf(classOf(expected.file));
+    expected.fileBefore = environment.filesAtFirst().at(expected.file);
+    expected.response = environment.ask(request);
+    expected.after = environment.instancesOf(classOf(expected.file));
+    expected.fileAfter = environment.files().at(expected.file);
+    return expected;
 }
 
-void expectPartOfAnswer(const Course& course, const testsupport::Outcome& outcome, bool lacksMemory) {
-    std::vector<ResultEvents> possible{course.done.outcome.events, course.withoutAsset.events};
+void expectPartOfAnswer(const ExpectedOutcome& expected, const testsupport::Outcome& outcome, bool lacksMemory) {
+    std::vector<ResultEvents> possible{expected.response.outcome.events, expected.withoutAsset.events};
     if (lacksMemory) {
-        possible.push_back(course.withoutSystem.events);
+        possible.push_back(expected.withoutSystem.events);
     }
     EXPECT_TRUE(std::any_of(possible.begin(), possible.end(), [&](const ResultEvents& each) {
         return isPartOf(outcome.events, each);
     })) << described(outcome.events);
-    EXPECT_LE(outcome.doneCount, course.done.outcome.doneCount);
+    EXPECT_LE(outcome.doneCount, expected.response.outcome.doneCount);
 }
 
-void expectSetInOrder(const Course& course, const Request& request, const Lines& now) {
-    Lines halfWay = course.before;
-    std::vector<Lines> possible{halfWay};
-    for (const NamedValue& given : request.instance.properties) {
-        for (std::size_t line = 0; line < halfWay.size(); ++line) {
-            if (halfWay[line].rfind(given.name + "=", 0) == 0) {
-                halfWay[line] = course.after.at(line);
+void expectSetInOrder(const ExpectedOutcome& expected, const Request& request, const Lines& now) {
+    Lines partial = expected.before;
+    std::vector<Lines> possible{partial};
+    for (const NamedValue& property : request.instance.properties) {
+        for (std::size_t line = 0; line < partial.size(); ++line) {
+            if (partial[line].rfind(property.name + "=", 0) == 0) {
+                partial[line] = expected.after.at(line);
             }
         }
-        possible.push_back(halfWay);
+        possible.push_back(partial);
     }
-    EXPECT_EQ(possible.back(), course.after);
+    EXPECT_EQ(possible.back(), expected.after);
     EXPECT_THAT(possible, testing::Contains(now));
 }
 
-bool hindersReading(const Fault& fault) {
+bool preventsReading(const Fault& fault) {
     constexpr std::array<std::pair<OperationKind, int>, 4> reading{{
         {operationOpen, 2},
         {operationStatus, 2},
@@ -155,40 +155,39 @@ bool hindersReading(const Fault& fault) {
     }};
     const bool isOfReading =
         std::find(reading.begin(), reading.end(), std::make_pair(fault.kind, fault.number)) != reading.end();
-    return mayHinderReading(fault) && (!isOnFiles(fault.kind) || isOfReading);
+    return mayPreventReading(fault) && (!isOnFiles(fault.kind) || isOfReading);
 }
 
-bool mayHinderReading(const Fault& fault) {
+bool mayPreventReading(const Fault& fault) {
     if (fault.lasting) {
-        return false;  // it cannot be written either
+        return false;  // writing fails as well
     }
     const bool isOfReading =
         fault.kind == operationOpen || fault.kind == operationRead || fault.kind == operationStatus;
-    const bool isPassedOver = fault.error == EINTR || fault.error == 0;
-    return !isOnFiles(fault.kind) || (isOfReading && !isPassedOver);
+    const bool isIgnored = fault.error == EINTR || fault.error == 0;
+    return !isOnFiles(fault.kind) || (isOfReading && !isIgnored);
 }
 
-std::string assetWithFields(const Course& course, std::size_t readFields) {
-    const Lines before = linesOf(course.fileBefore);
+std::string assetWithFields(const ExpectedOutcome& expected, std::size_t readFields) {
+    const Lines before = linesOf(expected.fileBefore);
     std::string content;
-    for (const std::string& line : linesOf(course.fileAfter)) {
-        const bool wasGiven = std::find(before.begin(), before.end(), line) == before.end();
+    for (const std::string& line : linesOf(expected.fileAfter)) {
+        const bool wasSet = std::find(before.begin(), before.end(), line) == before.end();
         const std::string key = line.substr(0, line.find('='));
         const auto isRead = [&](const char* name) { return key == std::string("USER.") + name; };
-        const bool keeps =
-            wasGiven ||
-            std::any_of(readInOrder.begin(), readInOrder.begin() + static_cast<std::ptrdiff_t>(readFields), isRead);
+        const bool keeps = wasSet || std::any_of(readInOrder.begin(),
+                                                 readInOrder.begin() + static_cast<std::ptrdiff_t>(readFields), isRead);
         content += (keeps ? line : key + "=") + "\n";
     }
     return content;
 }
 
-void expectAssetFile(const Course& course, const Fault& fault, const std::string& content) {
-    std::vector<std::string> possible{course.fileBefore, course.fileAfter};
-    if (mayHinderReading(fault)) {
+void expectAssetFile(const ExpectedOutcome& expected, const Fault& fault, const std::string& content) {
+    std::vector<std::string> possible{expected.fileBefore, expected.fileAfter};
+    if (mayPreventReading(fault)) {
         const std::size_t most = isOnFiles(fault.kind) ? 0 : readInOrder.size();
         for (std::size_t readFields = 0; readFields <= most; ++readFields) {
-            possible.push_back(assetWithFields(course, readFields));
+            possible.push_back(assetWithFields(expected, readFields));
         }
     }
     EXPECT_THAT(possible, testing::Contains(content));
