@@ -34,7 +34,7 @@ TEST(Stub, ReturnsTheSameInterfaceInEveryCallAndKeepsTheLatestBroker) {
     EXPECT_EQ(smallProvidersBroker(), &first);
     EXPECT_EQ(Small_Create_InstanceMI(&second, nullptr, nullptr), mi);
     EXPECT_EQ(smallProvidersBroker(), &second);
-    EXPECT_NE(Smaller_Create_InstanceMI(&first, nullptr, nullptr), mi) << "an interface of its own";
+    EXPECT_NE(Smaller_Create_InstanceMI(&first, nullptr, nullptr), mi) << "a separate interface";
 }
 
 TEST(Stub, RunsTheHookWithTheArgumentsOfTheFactory) {

@@ -74,7 +74,7 @@ TEST_F(AssetFaultTest, AFailureToSyncTheDirectoryIsIgnored) {
     const Fault fault{operationSync, 2, true, EIO};
     environment.restart();
     environment.ask(request, &fault);
-    EXPECT_EQ(environment.files().at(assetFile), expected.fileAfter) << "the directory could not be forced to the disk";
+    EXPECT_EQ(environment.files().at(assetFile), expected.fileAfter) << "the directory could not be synced";
 }
 
 constexpr FaultSelection everything{true, 100, true};
@@ -99,7 +99,7 @@ TEST_F(AssetFaultTest, OnlyAnUnreadableFileLosesUnsetValues) {
     EXPECT_EQ(operations, 25);
     EXPECT_THAT(losing, ElementsAre(Pair(operationOpen, 2), Pair(operationRead, 1), Pair(operationRead, 2),
                                     Pair(operationStatus, 2)))
-        << "all that reading it takes, and nothing that writing it does";
+        << "all operations that read the file and none that write it";
 }
 
 /** The second fault hits operations that follow only after a failure, such as a rollback. */
@@ -139,18 +139,18 @@ void plant(const char* path) {
 
 TEST_F(AssetFaultTest, ASymbolicLinkInPlaceOfTheTemporaryFileIsNotFollowed) {
     fs::path target = elsewhere();
-    testsupport::writeFile(target, "somebody else's");
+    testsupport::writeFile(target, "another user's");
     environment.restart();
     environment.library();
     plantedTarget = &target;
     setCreationObserver(&plant);
     environment.ask(request);
     setCreationObserver(nullptr);
-    EXPECT_EQ(testsupport::readFile(target), "somebody else's");
+    EXPECT_EQ(testsupport::readFile(target), "another user's");
     EXPECT_EQ(environment.files().at(assetFile), expected.fileAfter);
     EXPECT_FALSE(fs::is_symlink(file()));
     const FileContents planted = temporaryFiles();
-    ASSERT_EQ(planted.size(), 1U) << "it was in the way";
+    ASSERT_EQ(planted.size(), 1U) << "the link was created";
     EXPECT_TRUE(fs::is_symlink(environment.dataDirectory() / planted.begin()->first));
 }
 

@@ -96,18 +96,18 @@ public:
         temporaries += static_cast<int>(left.size()) - 3;
         checkAsset(left.at(assetFile), answered);
         for (const char* file : {leaseFile, warrantyFile, assetFile}) {
-            require(environment.ask(repairOf(file)).outcome.rc == CMPI_RC_OK, "the next process does not serve");
+            require(environment.ask(repairOf(file)).outcome.rc == CMPI_RC_OK, "the next process fails");
         }
         ++kills;
     }
 
     bool report() const {
-        std::cout << "kills                        " << kills << "\nsteps answered before them   " << steps
-                  << "\nasset.dat whole              " << assetsComplete << "\ntemporary files left         "
+        std::cout << "kills                        " << kills << "\nsteps completed before them  " << steps
+                  << "\nasset.dat complete           " << assetsComplete << "\ntemporary files left         "
                   << temporaries << '\n';
         print("Lease.dat", leases);
         print("Warranty.dat", warranties);
-        std::cout << "promises broken              " << broken << '\n';
+        std::cout << "errors                       " << broken << '\n';
         return broken == 0;
     }
 
@@ -126,7 +126,7 @@ private:
                 operations -= each.second;
             }
             if (write(output, &step, sizeof step) != sizeof step) {
-                throw std::runtime_error("nobody listens");
+                throw std::runtime_error("the pipe has no reader");
             }
         }
     }
@@ -147,7 +147,7 @@ private:
             std::this_thread::sleep_for(std::chrono::microseconds(upTo(maximumDelay)));
             kill(child, SIGKILL);
         }
-        require(waitForEnd(child), "the load came to an end");
+        require(waitForEnd(child), "the load was not killed");
         while (read(pipe[0], &step, sizeof step) == sizeof step) {
             last = step;
         }
@@ -178,7 +178,7 @@ private:
                               content.find("USER.Location=" + value) != std::string::npos);
         }
         require(found && std::count(content.begin(), content.end(), '\n') == 21,
-                "asset.dat is none that it may be after step " + std::to_string(answered));
+                "unexpected content of asset.dat after step " + std::to_string(answered));
         assetsComplete += found ? 1 : 0;
     }
 
@@ -190,7 +190,7 @@ private:
     }
 
     static void print(const char* file, const FileStatistics& files) {
-        std::cout << file << ": whole " << files.complete << ", empty " << files.empty << ", cut off "
+        std::cout << file << ": complete " << files.complete << ", empty " << files.empty << ", truncated "
                   << files.truncated << "; records lost in these " << files.recordsLost << " of "
                   << (files.empty + files.truncated) * records << '\n';
     }

@@ -110,7 +110,7 @@ TEST_F(LogFaultTest, ADirectoryThatIsRemovedDuringRotationIsNotCreatedAgain) {
 TEST_F(LogFaultTest, APipeInPlaceOfTheLogIsNotOpenedDuringRotation) {
     const Request& request = requestNamed("DeleteWarranty");
     const Fault planting{operationOpen, 1, false, 0, [&] {
-                             EXPECT_FALSE(fs::exists(log)) << "the full one has been renamed";
+                             EXPECT_FALSE(fs::exists(log)) << "the full log was renamed";
                              EXPECT_EQ(mkfifo(log.c_str(), 0600), 0);
                          }};
     EXPECT_EQ(environment.ask(request, &planting).outcome.rc, CMPI_RC_OK);

@@ -48,7 +48,7 @@ protected:
         EXPECT_EQ(response.leakedDescriptors, 0);
         expectPartOfAnswer(expected, response.outcome, !isOnFiles(fault.kind));
         const FileContents files = environment.files();
-        EXPECT_THAT(namesOf(files), ElementsAre(leaseFile, warrantyFile, assetFile)) << "a temporary file stays";
+        EXPECT_THAT(namesOf(files), ElementsAre(leaseFile, warrantyFile, assetFile)) << "a temporary file remains";
         for (const auto& [name, content] : environment.filesAtFirst()) {
             if (!changes() || name != file()) {
                 EXPECT_EQ(files.at(name), content);
@@ -90,7 +90,7 @@ private:
         if (file() == assetFile) {
             EXPECT_NE(whole.find("USER.Location=repaired\n"), std::string::npos);
         } else if (fault.kind == operationWrite) {
-            EXPECT_THAT(whole, StartsWith(content)) << "the beginning of what is in memory";
+            EXPECT_THAT(whole, StartsWith(content)) << "the beginning of the records in memory";
         } else {
             EXPECT_THAT(content, AnyOf(expected.fileBefore, whole)) << "as before or as in memory";
         }

@@ -83,7 +83,7 @@ TEST_F(RewriteFaultTest, AFailedLineIsTheLast) {
     const std::string whole = wholeFile();
     for (int number = 1; number <= writesOfRewrite; ++number) {
         ASSERT_EQ(rewriteWith(writeFailing(number, false)), firstLines(whole, number))
-            << "it is written when the file is closed, and nothing after it";
+            << "it is written when the file is closed, and no further line";
     }
 }
 
@@ -91,7 +91,7 @@ TEST_F(RewriteFaultTest, PartialAndInterruptedWritesAreCompleted) {
     const std::string whole = wholeFile();
     for (const int number : {1, 2, writesOfRewrite / 2, writesOfRewrite}) {
         EXPECT_EQ(rewriteWith(writeFailing(number, false, EINTR)), whole);
-        EXPECT_EQ(rewriteWith(writeFailing(number, true, 0)), whole) << "each in parts";
+        EXPECT_EQ(rewriteWith(writeFailing(number, true, 0)), whole) << "each partially";
     }
 }
 
@@ -111,7 +111,7 @@ TEST_F(RewriteFaultTest, OneFailedAllocationKeepsTheFileOrWritesItWithTheValuesS
         ASSERT_THAT(seen, testing::Each(testing::AnyOfArray(possible)));
     }
     EXPECT_EQ(seen.count(before), 1U);
-    EXPECT_GT(seen.size(), 2U) << "half-way modifications";
+    EXPECT_GT(seen.size(), 2U) << "partial modifications";
 }
 
 TEST_F(RewriteFaultTest, LastingAllocationFailuresKeepTheFile) {
@@ -139,7 +139,7 @@ TEST_F(RewriteFaultTest, ARestartLoadsCompleteRecordsAndCopiesInPlaceOfTheRest) 
     const std::vector<Lines> before = leasesListed();
     EXPECT_EQ(rewriteWith(writeFailing(1, true)), "");
     environment.unload();
-    EXPECT_EQ(leasesListed().size(), 0U) << "an empty file is no lease";
+    EXPECT_EQ(leasesListed().size(), 0U) << "an empty file contains no leases";
     for (int number = 2; number <= writesOfRewrite; ++number) {
         SCOPED_TRACE(number);
         rewriteWith(writeFailing(number, true));

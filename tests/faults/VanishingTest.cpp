@@ -54,7 +54,7 @@ protected:
         if (isAnswered) {
             expectPartOfAnswer(expected, outcome);
         } else {
-            EXPECT_TRUE(hasGate()) << "the provider's answer is the same";
+            EXPECT_TRUE(hasGate()) << "the provider returns the same status";
             EXPECT_EQ(outcome.rc, CMPI_RC_ERR_FAILED);
             EXPECT_THAT(outcome.message, Not(IsEmpty()));
         }
@@ -80,7 +80,7 @@ protected:
     void expectServedWithoutDirectory() {
         const Response response = environment.ask(otherChangeOf(file()));
         EXPECT_EQ(response.outcome.rc, hasGate() ? CMPI_RC_ERR_FAILED : CMPI_RC_OK);
-        EXPECT_FALSE(fs::exists(data())) << "nobody makes it";
+        EXPECT_FALSE(fs::exists(data())) << "it is not created";
     }
 
     void expectNextChangeStoresEverything() {

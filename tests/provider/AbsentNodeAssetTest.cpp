@@ -34,7 +34,7 @@ TEST_F(AbsentNodeAsset, DoesNotReadTheFile) {
     const AssetIDDetails element;
     expectNothingStored(element);
     EXPECT_THAT(
-        textsOf("AssetIDDetails.cpp", "AssetIDDetails"),
+        logMessagesOf("AssetIDDetails.cpp", "AssetIDDetails"),
         ElementsAre(entering("AssetIDDetails", "AssetIDDetails.cpp"), exiting("AssetIDDetails", "AssetIDDetails.cpp")));
 }
 
@@ -45,12 +45,12 @@ TEST_F(AbsentNodeAsset, CreatesTheFile) {
 
 TEST_F(AbsentNodeAsset, StartsAtTheComputerIfThereIsOne) {
     AssetIDDetails element;
-    EXPECT_EQ(stands(element), hasComputer);
+    EXPECT_EQ(hasCurrent(element), hasComputer);
     std::string text = "before";
     EXPECT_EQ(element.getName(text), hasComputer);
     EXPECT_EQ(text, hasComputer ? "testhost" : "before");
     ++element;
-    EXPECT_FALSE(stands(element));
+    EXPECT_FALSE(hasCurrent(element));
 }
 
 TEST_F(AbsentNodeAsset, ReturnsVendorAndIdentifyingNumberIfThereIsASystem) {

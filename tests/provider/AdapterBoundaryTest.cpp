@@ -16,7 +16,7 @@ namespace {
 /** Called before the framework returns the computer's path; counts the calls. */
 struct ComputerDouble {
     std::function<void()> before = [] {};
-    int asked = 0;
+    int calls = 0;
 };
 
 ComputerDouble& computer() {
@@ -29,7 +29,7 @@ constexpr const char* onlyProperty = "SystemLocation";
 }  // namespace
 
 std::string KO::Instrumentation::getPathToComputer() {
-    ++computer().asked;
+    ++computer().calls;
     computer().before();
     return "/system/computer";
 }
@@ -84,7 +84,7 @@ protected:
         RequestTest::TearDown();
     }
 
-    static void expectNothingMade() {
+    static void expectNothingCreated() {
         EXPECT_THAT(LeaseBase::cache.table, IsEmpty());
         EXPECT_THAT(WarrantyBase::cache.table, IsEmpty());
         EXPECT_TRUE(std::filesystem::is_empty(agentEnvironment::dataDirectory()));
@@ -95,9 +95,9 @@ protected:
 
 TEST_F(CreationBoundary, RequestsTheComputersPathOnce) {
     for (const char* className : classNames) {
-        computer().asked = 0;
+        computer().calls = 0;
         EXPECT_EQ(create(className, {textKey("InstanceID", "A")}), CMPI_RC_OK);
-        EXPECT_EQ(computer().asked, 1) << className;
+        EXPECT_EQ(computer().calls, 1) << className;
     }
     EXPECT_EQ(LeaseBase::cache.table.size(), 1U);
     EXPECT_EQ(WarrantyBase::cache.table.size(), 1U);
@@ -105,13 +105,13 @@ TEST_F(CreationBoundary, RequestsTheComputersPathOnce) {
 
 TEST_F(CreationBoundary, RequestsTheComputersPathEvenWithoutAKey) {
     for (const char* className : classNames) {
-        computer().asked = 0;
+        computer().calls = 0;
         EXPECT_EQ(create(className, {}), CMPI_RC_OK);
-        EXPECT_EQ(computer().asked, 1) << className;
+        EXPECT_EQ(computer().calls, 1) << className;
         EXPECT_THAT(events, ElementsAre(testing::VariantWith<cimhost::Done>(testing::_)));
         events.clear();
     }
-    expectNothingMade();
+    expectNothingCreated();
 }
 
 TEST_F(CreationBoundary, CreatesNothingIfTheComputersPathIsNotAvailable) {
@@ -121,10 +121,10 @@ TEST_F(CreationBoundary, CreatesNothingIfTheComputersPathIsNotAvailable) {
         EXPECT_THAT(events, IsEmpty());
     }
     const std::string file = "LeaseAndWarrantyProvider.cpp";
-    EXPECT_THAT(textsOf(file, "LeaseAndWarranty_CreateInstance"),
+    EXPECT_THAT(logMessagesOf(file, "LeaseAndWarranty_CreateInstance"),
                 ElementsAre(variable("classId", "20", file), message("no tree", file), variable("classId", "21", file),
                             message("no tree", file)));
-    expectNothingMade();
+    expectNothingCreated();
 }
 
 }  // namespace

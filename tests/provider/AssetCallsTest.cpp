@@ -119,7 +119,7 @@ TEST_F(AssetCalls, WriteTheFileUnderTheLock) {
 TEST_F(AssetCalls, OfAccessorsAccessNoFile) {
     AssetIDDetails element;
     EXPECT_TRUE(callsOf([&] {
-                    for (const TextGetter& getter : textGetters) {
+                    for (const TextGetter& getter : stringGetters) {
                         valueOf(element, getter);
                     }
                     element.setOwnerName("Anna");
@@ -145,7 +145,7 @@ TEST_F(AssetCalls, ThatFailToReadLeaveNoValuesAndReleaseTheLock) {
             const AssetIDDetails element;
             expectNothingStored(element);
             EXPECT_FALSE(assetFileDouble::locked());
-            EXPECT_THAT(textsOf(source, "AssetIDDetails"), Contains(message(readingFailed, source)));
+            EXPECT_THAT(logMessagesOf(source, "AssetIDDetails"), Contains(message(readingFailed, source)));
         }
     }
 }
@@ -174,7 +174,7 @@ TEST_F(AssetCalls, ThatCannotLockForReadingReadNothing) {
         Calls expected = creation;
         expected.insert(expected.end(), {"PropertyFile asset.dat", lock, "~PropertyFile"});
         EXPECT_THAT(callsOf([] { expectNothingStored(AssetIDDetails()); }), ElementsAreArray(expected));
-        EXPECT_THAT(textsOf(source, "AssetIDDetails"), Contains(message(readingFailed, source)));
+        EXPECT_THAT(logMessagesOf(source, "AssetIDDetails"), Contains(message(readingFailed, source)));
     }
 }
 
@@ -196,49 +196,50 @@ TEST_F(AssetCalls, ThatCannotLockForCreatingTheFileCreateNoFile) {
 
 /** Returns, for each release of the lock in an operation, whether the failure was already logged. */
 template <class Operation>
-std::vector<bool> toldWhenUnlocked(const char* function, const char* text, Operation operation) {
-    std::vector<bool> told;
+std::vector<bool> loggedWhenUnlocked(const char* function, const char* text, Operation operation) {
+    std::vector<bool> wasLogged;
     agentEnvironment::forgetLog();
     assetFileDouble::before("unlock", [&] {
-        const auto texts = textsOf(source, function);
-        told.push_back(std::find(texts.begin(), texts.end(), message(text, source)) != texts.end());
+        const auto logMessages = logMessagesOf(source, function);
+        wasLogged.push_back(std::find(logMessages.begin(), logMessages.end(), message(text, source)) !=
+                            logMessages.end());
     });
     operation();
-    EXPECT_THAT(textsOf(source, function), Contains(message(text, source)));
+    EXPECT_THAT(logMessagesOf(source, function), Contains(message(text, source)));
     assetFileDouble::before("unlock", [] {});
-    return told;
+    return wasLogged;
 }
 
 TEST_F(AssetCalls, ThatFailToReadAreLoggedBeforeTheLockIsReleased) {
     const auto make = [] { AssetIDDetails(); };
     assetFileDouble::before("File::open 3", failures[0]);
-    EXPECT_THAT(toldWhenUnlocked("getFileName", creationFailed, make), ElementsAre(true, true));
+    EXPECT_THAT(loggedWhenUnlocked("getFileName", creationFailed, make), ElementsAre(true, true));
     assetFileDouble::forget();
     assetFileDouble::before("read text USER.Phone", failures[0]);
-    EXPECT_THAT(toldWhenUnlocked("AssetIDDetails", readingFailed, make), ElementsAre(false, true))
+    EXPECT_THAT(loggedWhenUnlocked("AssetIDDetails", readingFailed, make), ElementsAre(false, true))
         << "the lock is first held for the file's creation";
 }
 
 TEST_F(AssetCalls, ThatFailToWriteAreLoggedAfterTheLockIsReleased) {
     AssetIDDetails element;
     assetFileDouble::before("PropertyFile::close", failures[0]);
-    EXPECT_THAT(toldWhenUnlocked("flushAssetData", writingFailed, [&] { element.flushAssetData(); }),
+    EXPECT_THAT(loggedWhenUnlocked("flushAssetData", writingFailed, [&] { element.flushAssetData(); }),
                 ElementsAre(false));
 }
 
 TEST_F(AssetCalls, ReadLabelAndDataOfAPairBeforeEitherIsLogged) {
-    std::vector<std::size_t> toldBefore;
+    std::vector<std::size_t> loggedBefore;
     for (const char* number : {"1", "2", "3", "4", "5"}) {
         assetFileDouble::before(std::string("read text USER.PersonalizedData") + number, [&] {
-            const auto texts = textsOf(source, "AssetIDDetails");
-            toldBefore.push_back(
-                static_cast<std::size_t>(std::count_if(texts.begin(), texts.end(), [](const std::string& text) {
+            const auto logMessages = logMessagesOf(source, "AssetIDDetails");
+            loggedBefore.push_back(static_cast<std::size_t>(
+                std::count_if(logMessages.begin(), logMessages.end(), [](const std::string& text) {
                     return text == variable("label", "Null", source) || text == variable("data", "Null", source);
                 })));
         });
     }
     AssetIDDetails();
-    EXPECT_THAT(toldBefore, ElementsAre(0, 2, 4, 6, 8));
+    EXPECT_THAT(loggedBefore, ElementsAre(0, 2, 4, 6, 8));
 }
 
 TEST_F(AssetCalls, KeepValuesReadBeforeAFailure) {
@@ -279,7 +280,7 @@ TEST_F(AssetCalls, ThatFailToWriteAreOnlyLoggedAndReleaseTheLock) {
             agentEnvironment::forgetLog();
             element.flushAssetData();
             EXPECT_FALSE(assetFileDouble::locked());
-            EXPECT_THAT(textsOf(source, "flushAssetData"), Contains(message(writingFailed, source)));
+            EXPECT_THAT(logMessagesOf(source, "flushAssetData"), Contains(message(writingFailed, source)));
         }
     }
 }

@@ -27,7 +27,7 @@ protected:
         return text;
     }
 
-    static std::vector<std::string> walked(AssetIDDetails& element) {
+    static std::vector<std::string> visited(AssetIDDetails& element) {
         std::vector<std::string> names;
         for (; element; ++element) {
             names.push_back(name(element));
@@ -50,53 +50,53 @@ protected:
 
 TEST_F(AssetCursor, VisitsEveryComputerWithoutAFilter) {
     AssetIDDetails element;
-    EXPECT_THAT(walked(element), ElementsAre("spaced", "tight", "dashless", "dash first", "dash second", "many dashes",
-                                             "empty", "productless", "(none)"));
-    EXPECT_THAT(textsOf("AssetIDDetails.cpp", "evaluate"), IsEmpty());
+    EXPECT_THAT(visited(element), ElementsAre("spaced", "tight", "dashless", "dash first", "dash second", "many dashes",
+                                              "empty", "productless", "(none)"));
+    EXPECT_THAT(logMessagesOf("AssetIDDetails.cpp", "evaluate"), IsEmpty());
     EXPECT_TRUE(element.evaluate());
 }
 
 TEST_F(AssetCursor, SelectsComputersByNameAndThoseWithoutAName) {
     AssetIDDetails element;
     filter(element, AssetIDDetails::FILTER_NAME, "tight");
-    EXPECT_THAT(walked(element), ElementsAre("tight", "(none)"));
+    EXPECT_THAT(visited(element), ElementsAre("tight", "(none)"));
 }
 
 TEST_F(AssetCursor, StaysAtTheEnd) {
     AssetIDDetails element;
-    walked(element);
+    visited(element);
     ++element;
-    EXPECT_FALSE(stands(element));
+    EXPECT_FALSE(hasCurrent(element));
 }
 
 TEST_F(AssetCursor, FiltersByTheVendorOfTheSystem) {
     AssetIDDetails matching;
     filter(matching, AssetIDDetails::FILTER_VENDOR, "Example Maker");
-    EXPECT_EQ(walked(matching).size(), 9U);
+    EXPECT_EQ(visited(matching).size(), 9U);
     for (const char* vendor : {"EXAMPLE MAKER", "Computer Maker", "Other Maker", "Example Maker ", ""}) {
         AssetIDDetails element;
         filter(element, AssetIDDetails::FILTER_VENDOR, vendor);
-        EXPECT_FALSE(stands(element)) << vendor;
+        EXPECT_FALSE(hasCurrent(element)) << vendor;
     }
 }
 
 TEST_F(AssetCursor, FiltersByTheVersionOfTheProduct) {
     AssetIDDetails matching;
     filter(matching, AssetIDDetails::FILTER_VERSION, "4.2.0");
-    EXPECT_EQ(walked(matching).size(), 9U);
+    EXPECT_EQ(visited(matching).size(), 9U);
     AssetIDDetails other;
     filter(other, AssetIDDetails::FILTER_VERSION, "4.2");
-    EXPECT_FALSE(stands(other));
+    EXPECT_FALSE(hasCurrent(other));
 }
 
 TEST_F(AssetCursor, FiltersByIdentifyingNumberForTypeZeroAndUnnamedTypes) {
     for (const int type : {0, 4, 7, -1}) {
         AssetIDDetails matching;
         filter(matching, type, "/system%20one");
-        EXPECT_EQ(walked(matching).size(), 9U) << type;
+        EXPECT_EQ(visited(matching).size(), 9U) << type;
         AssetIDDetails other;
         filter(other, type, "/system one");
-        EXPECT_FALSE(stands(other)) << type;
+        EXPECT_FALSE(hasCurrent(other)) << type;
     }
 }
 
@@ -107,7 +107,7 @@ TEST_F(AssetCursor, RequiresEveryFilterToPass) {
     EXPECT_EQ(name(element), "dashless");
     EXPECT_TRUE(element.evaluate());
     filter(element, AssetIDDetails::FILTER_VERSION, "another");
-    EXPECT_FALSE(stands(element));
+    EXPECT_FALSE(hasCurrent(element));
     EXPECT_FALSE(element.evaluate());
 }
 
@@ -116,7 +116,7 @@ TEST_F(AssetCursor, FiltersFromTheCurrentComputer) {
     ++element;
     ++element;
     filter(element, AssetIDDetails::FILTER_NAME, "tight");
-    EXPECT_THAT(walked(element), ElementsAre("(none)"));
+    EXPECT_THAT(visited(element), ElementsAre("(none)"));
 }
 
 TEST_F(AssetCursor, ReturnsTheComputersNameFromBothGetters) {
@@ -127,7 +127,7 @@ TEST_F(AssetCursor, ReturnsTheComputersNameFromBothGetters) {
     text.clear();
     EXPECT_TRUE(element.getName(text));
     EXPECT_EQ(text, "spaced");
-    while (stands(element)) {
+    while (hasCurrent(element)) {
         ++element;
     }
     text = "before";

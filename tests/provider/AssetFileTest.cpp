@@ -15,7 +15,7 @@ TEST_F(AssetFile, IsCreatedEmptyAndReadAsEmptyValues) {
     const AssetIDDetails element;
     ASSERT_TRUE(std::filesystem::is_regular_file(path()));
     EXPECT_EQ(file(), "");
-    for (const TextGetter& getter : textGetters) {
+    for (const TextGetter& getter : stringGetters) {
         EXPECT_EQ(valueOf(element, getter), "") << getter.name;
     }
     for (const TextGetter& getter : dateGetters) {
@@ -26,7 +26,7 @@ TEST_F(AssetFile, IsCreatedEmptyAndReadAsEmptyValues) {
 
 TEST_F(AssetFile, ReturnsTheValueOfEachKey) {
     std::string content;
-    for (const TextGetter& getter : textGetters) {
+    for (const TextGetter& getter : stringGetters) {
         content += std::string(getter.key) + "=text of " + getter.key + "\n";
     }
     content +=
@@ -34,7 +34,7 @@ TEST_F(AssetFile, ReturnsTheValueOfEachKey) {
         "USER.ZOPMUpdateTime=20260101000000.000000+060\n";
     write(path(), content);
     const AssetIDDetails element;
-    for (const TextGetter& getter : textGetters) {
+    for (const TextGetter& getter : stringGetters) {
         EXPECT_EQ(valueOf(element, getter), std::string("text of ") + getter.key) << getter.name;
     }
     EXPECT_EQ(valueOf(element, dateGetters[0]), "20240101000000.000000+000");
@@ -69,13 +69,13 @@ TEST_F(AssetFile, ReturnsAnUnsetDateForAnInvalidDate) {
     write(path(), "USER.PurchaseDate=yesterday\nUSER.AssetNumber=A-1\n");
     const AssetIDDetails element;
     EXPECT_EQ(valueOf(element, dateGetters[1]), noDate);
-    EXPECT_EQ(valueOf(element, textGetters[0]), "A-1");
+    EXPECT_EQ(valueOf(element, stringGetters[0]), "A-1");
 }
 
 TEST_F(AssetFile, IsUnchangedByReading) {
     const std::string content = "# by hand\nUSER.Name = Anna \nOTHER=1\nnot a property\n";
     write(path(), content);
-    EXPECT_EQ(valueOf(AssetIDDetails(), textGetters[2]), "Anna");
+    EXPECT_EQ(valueOf(AssetIDDetails(), stringGetters[2]), "Anna");
     EXPECT_EQ(file(), content);
 }
 
@@ -83,7 +83,7 @@ TEST_F(AssetFile, IsInTheDataDirectory) {
     AssetIDDetails element;
     std::filesystem::remove(path());
     EXPECT_EQ(std::filesystem::path(element.getFileName()), path());
-    EXPECT_TRUE(std::filesystem::exists(path())) << "asking for the path creates the file";
+    EXPECT_TRUE(std::filesystem::exists(path())) << "getFileName() creates the file";
 }
 
 TEST_F(AssetFile, IsUnchangedByGetFileName) {
@@ -94,7 +94,7 @@ TEST_F(AssetFile, IsUnchangedByGetFileName) {
 }
 
 /** Expects the log records of a file that cannot be opened. */
-void expectFailureTold() {
+void expectFailureLogged() {
     const auto creation = recordsOf("AssetIDDetails.cpp", "getFileName");
     ASSERT_EQ(creation.size(), 3U);
     EXPECT_EQ(withoutLine(creation[1].text),
@@ -112,21 +112,21 @@ TEST_F(AssetFile, ProvidesNoValuesAndThrowsNothingIfItCannotBeOpened) {
     blockWithDirectory(path());
     const AssetIDDetails element;
     expectNothingStored(element);
-    expectFailureTold();
+    expectFailureLogged();
 }
 
 TEST_F(AssetFile, ProvidesNoValuesWithoutADataDirectory) {
     std::filesystem::remove_all(agentEnvironment::dataDirectory());
     const AssetIDDetails element;
     expectNothingStored(element);
-    expectFailureTold();
+    expectFailureLogged();
 }
 
 TEST_F(AssetFile, DoesNotAffectTheCursorIfItCannotBeOpened) {
     blockWithDirectory(path());
     AssetIDDetails element;
     std::string text;
-    EXPECT_TRUE(stands(element));
+    EXPECT_TRUE(hasCurrent(element));
     EXPECT_TRUE(element.getName(text));
     EXPECT_EQ(text, "spaced");
     element.setFilter(AssetIDDetails::FILTER_NAME, "tight");
@@ -139,14 +139,14 @@ TEST_F(AssetFile, IsReadAgainByTheNextElement) {
     expectNothingStored(AssetIDDetails());
     std::filesystem::remove(path());
     write(path(), "USER.Name=Anna\n");
-    EXPECT_EQ(valueOf(AssetIDDetails(), textGetters[2]), "Anna");
+    EXPECT_EQ(valueOf(AssetIDDetails(), stringGetters[2]), "Anna");
 }
 
 TEST_F(AssetFile, IsReadOncePerElement) {
     write(path(), "USER.Name=Anna\n");
     const AssetIDDetails element;
     write(path(), "USER.Name=Berta\n");
-    EXPECT_EQ(valueOf(element, textGetters[2]), "Anna");
+    EXPECT_EQ(valueOf(element, stringGetters[2]), "Anna");
 }
 
 /** Expects that the lock is not held. */

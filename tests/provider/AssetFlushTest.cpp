@@ -64,7 +64,7 @@ TEST_F(AssetFlush, WritesEachChangedStringWithItsKey) {
         std::filesystem::remove(path());
         AssetIDDetails element;
         (element.*setter.set)("new text");
-        const TextGetter& getter = textGetters[setter.getter];
+        const TextGetter& getter = stringGetters[setter.getter];
         EXPECT_EQ(valueOf(element, getter), "new text");
         EXPECT_EQ(file(), "") << "nothing is written before it is flushed";
         element.setPersonalizedData({});
@@ -115,8 +115,8 @@ TEST_F(AssetFlush, KeepsTheAssetTag) {
     element.setAssetNumber("A-1");
     element.flushAssetData();
     const AssetIDDetails reread;
-    EXPECT_EQ(valueOf(reread, textGetters[1]), "TAG-1");
-    EXPECT_EQ(valueOf(reread, textGetters[0]), "A-1");
+    EXPECT_EQ(valueOf(reread, stringGetters[1]), "TAG-1");
+    EXPECT_EQ(valueOf(reread, stringGetters[0]), "A-1");
 }
 
 TEST_F(AssetFlush, KeepsUnknownKeys) {
@@ -137,8 +137,8 @@ TEST_F(AssetFlush, OverwritesLaterChangesOfTheFileWithTheSnapshot) {
     element.setOwnerPhone("3");
     element.flushAssetData();
     const AssetIDDetails reread;
-    EXPECT_EQ(valueOf(reread, textGetters[2]), "Anna");
-    EXPECT_EQ(valueOf(reread, textGetters[3]), "3");
+    EXPECT_EQ(valueOf(reread, stringGetters[2]), "Anna");
+    EXPECT_EQ(valueOf(reread, stringGetters[3]), "3");
 }
 
 TEST_F(AssetFlush, WritesExistingPairsAndKeepsTheOthers) {
@@ -175,7 +175,7 @@ TEST_F(AssetFlush, KeepsAnyStringExactly) {
         element.setPersonalizedData({{text, text}});
         element.flushAssetData();
         const AssetIDDetails reread;
-        EXPECT_EQ(valueOf(reread, textGetters[2]), text);
+        EXPECT_EQ(valueOf(reread, stringGetters[2]), text);
         EXPECT_EQ(pairsOf(reread)[0], (AssetIDDetails::PersonalizedPair{text, text}));
     }
 }
@@ -202,14 +202,14 @@ TEST_F(AssetFlush, OnlyLogsFailures) {
     agentEnvironment::forgetLog();
     element.setOwnerName("Anna");
     element.flushAssetData();
-    EXPECT_THAT(textsOf("AssetIDDetails.cpp", "flushAssetData"),
+    EXPECT_THAT(logMessagesOf("AssetIDDetails.cpp", "flushAssetData"),
                 ElementsAre(entering("flushAssetData", "AssetIDDetails.cpp"),
                             message("Throwing Exception while writing Data", "AssetIDDetails.cpp"),
                             exiting("flushAssetData", "AssetIDDetails.cpp")));
     for (const LogRecord& record : recordsOf("AssetIDDetails.cpp", "flushAssetData")) {
         EXPECT_EQ(record.level, 4000);
     }
-    EXPECT_EQ(valueOf(element, textGetters[2]), "Anna") << "the snapshot is kept";
+    EXPECT_EQ(valueOf(element, stringGetters[2]), "Anna") << "the snapshot is kept";
 }
 
 TEST_F(AssetFlush, WritesEmptyValuesAfterAFailedRead) {

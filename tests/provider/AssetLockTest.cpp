@@ -12,7 +12,7 @@ using namespace providerTest;
 
 /** Waits until a function of the asset element has logged its entry. */
 void awaitEntry(const std::string& function) {
-    while (textsOf("AssetIDDetails.cpp", function).empty()) {
+    while (logMessagesOf("AssetIDDetails.cpp", function).empty()) {
         std::this_thread::yield();
     }
 }
@@ -21,17 +21,17 @@ using AssetLock = AssetFile;
 
 TEST_F(AssetLock, PreventsConcurrentCreationOfTheFile) {
     KO::_fileMutex.lock(withoutLimit);
-    std::atomic<bool> made{false};
+    std::atomic<bool> isConstructed{false};
     std::thread other([&] {
         const AssetIDDetails element;
-        made = true;
+        isConstructed = true;
     });
     awaitEntry("getFileName");
-    EXPECT_FALSE(made);
+    EXPECT_FALSE(isConstructed);
     EXPECT_FALSE(std::filesystem::exists(path()));
     KO::_fileMutex.unlock();
     other.join();
-    EXPECT_TRUE(made);
+    EXPECT_TRUE(isConstructed);
     EXPECT_TRUE(std::filesystem::exists(path()));
 }
 
@@ -51,7 +51,7 @@ TEST_F(AssetLock, PreventsConcurrentWritingOfTheFile) {
     KO::_fileMutex.unlock();
     other.join();
     EXPECT_TRUE(written);
-    EXPECT_EQ(valueOf(AssetIDDetails(), textGetters[2]), "Anna");
+    EXPECT_EQ(valueOf(AssetIDDetails(), stringGetters[2]), "Anna");
 }
 
 }  // namespace

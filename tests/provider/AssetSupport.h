@@ -24,7 +24,7 @@ struct TextGetter {
 };
 
 /** Stored strings, then stored dates. */
-inline const std::vector<TextGetter> textGetters = {
+inline const std::vector<TextGetter> stringGetters = {
     {"getAssetNumber", &AssetIDDetails::getAssetNumber, "USER.AssetNumber"},
     {"getAssetIdTag", &AssetIDDetails::getAssetIdTag, "USER.AssetIdTag"},
     {"getPrimaryOwnerName", &AssetIDDetails::getPrimaryOwnerName, "USER.Name"},
@@ -60,7 +60,7 @@ inline Pairs pairsOf(const AssetIDDetails& element) {
 
 /** Expects that no getter of a stored value returns true or changes its argument. */
 inline void expectNothingStored(const AssetIDDetails& element) {
-    for (const auto& getters : {textGetters, dateGetters}) {
+    for (const auto& getters : {stringGetters, dateGetters}) {
         for (const TextGetter& getter : getters) {
             EXPECT_EQ(valueOf(element, getter), "(none)") << getter.name;
         }

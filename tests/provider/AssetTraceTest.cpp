@@ -15,7 +15,7 @@ using AssetTrace = AssetFile;
 
 TEST_F(AssetTrace, LogsTheFilePath) {
     const AssetIDDetails element;
-    EXPECT_THAT(textsOf(source, "getFileName"),
+    EXPECT_THAT(logMessagesOf(source, "getFileName"),
                 ElementsAre(entering("getFileName", source),
                             message("Asset.dat file opened in write mode Successfully", source),
                             exiting("getFileName", source)));
@@ -39,17 +39,17 @@ TEST_F(AssetTrace, LogsTheValuesThatItReads) {
         expected.push_back(variable("data", "Null", source));
     }
     expected.push_back(exiting("AssetIDDetails", source));
-    EXPECT_EQ(textsOf(source, "AssetIDDetails"), expected);
+    EXPECT_EQ(logMessagesOf(source, "AssetIDDetails"), expected);
     for (const LogRecord& record : agentEnvironment::log()) {
         EXPECT_EQ(record.level, 4000);
         EXPECT_EQ(record.logger, "Tarvik.LeaseWarrantyProvider");
     }
-    EXPECT_EQ(texts("log"), texts("trace"));
+    EXPECT_EQ(logMessages("log"), logMessages("trace"));
 }
 
 TEST_F(AssetTrace, CreatesTheFileBeforeItLogsItsConstruction) {
     const AssetIDDetails element;
-    const auto lines = texts();
+    const auto lines = logMessages();
     ASSERT_GT(lines.size(), 4U);
     EXPECT_EQ(lines[0], entering("getFileName", source));
     EXPECT_EQ(lines[2], exiting("getFileName", source));
@@ -60,7 +60,7 @@ TEST_F(AssetTrace, LogsFiltersAtErrorLevel) {
     AssetIDDetails element;
     agentEnvironment::forgetLog();
     element.setFilter(AssetIDDetails::FILTER_NAME, "tight");
-    EXPECT_THAT(textsOf(source, "setFilter"),
+    EXPECT_THAT(logMessagesOf(source, "setFilter"),
                 ElementsAre(entering("setFilter", source, " filterType=1 reference=tight"),
                             exiting("setFilter", source, " filterType=1 reference=tight")));
     for (const LogRecord& record : recordsOf(source, "setFilter")) {
@@ -74,7 +74,7 @@ TEST_F(AssetTrace, LogsFiltersAtErrorLevel) {
 TEST_F(AssetTrace, LogsEntryAndExitOfItsOperations) {
     AssetIDDetails element;
     agentEnvironment::forgetLog();
-    EXPECT_TRUE(stands(element));
+    EXPECT_TRUE(hasCurrent(element));
     ++element;
     std::string text;
     element.getAssetNumber(text);
@@ -91,7 +91,7 @@ TEST_F(AssetTrace, LogsEntryAndExitOfItsOperations) {
         expected.push_back(entering(function, source));
         expected.push_back(exiting(function, source));
     }
-    EXPECT_EQ(texts(), expected);
+    EXPECT_EQ(logMessages(), expected);
 }
 
 }  // namespace

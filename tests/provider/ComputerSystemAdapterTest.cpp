@@ -39,7 +39,7 @@ public:
     CMPIObjectPath* path(std::size_t index) { return &paths.at(index); }
 
     /** Sets the type and the state of an element of the enumeration. */
-    void give(std::size_t index, CMPIType type, CMPIValueState state) {
+    void setElement(std::size_t index, CMPIType type, CMPIValueState state) {
         types.at(index) = type;
         states.at(index) = state;
     }
@@ -49,9 +49,9 @@ public:
     CMPIrc pathStatus = CMPI_RC_OK;
 
     int enumerations = 0;
-    const CMPIContext* contextGiven = nullptr;
-    const CMPIObjectPath* pathGiven = nullptr;
-    bool listGiven = false;
+    const CMPIContext* receivedContext = nullptr;
+    const CMPIObjectPath* receivedPath = nullptr;
+    bool receivedList = false;
 
 private:
     template <class Handle>
@@ -63,9 +63,9 @@ private:
                                                const CMPIObjectPath* path, const char** properties, CMPIStatus* rc) {
         Manager& manager = of(broker);
         ++manager.enumerations;
-        manager.contextGiven = context;
-        manager.pathGiven = path;
-        manager.listGiven = properties != nullptr;
+        manager.receivedContext = context;
+        manager.receivedPath = path;
+        manager.receivedList = properties != nullptr;
         *rc = {CMPI_RC_OK, nullptr};
         return &manager.enumeration;
     }
@@ -112,7 +112,7 @@ private:
 class ComputerSystemAdapter : public CleanAgent {
 protected:
     static void expectNone(CMPILAWComputerSystem& adapter) {
-        EXPECT_FALSE(stands(adapter));
+        EXPECT_FALSE(hasCurrent(adapter));
         EXPECT_EQ(adapter.getObjectPath(), nullptr);
         EXPECT_EQ(adapter.getCMPIInstance(nullptr), nullptr);
     }
@@ -142,7 +142,7 @@ TEST_F(ComputerSystemAdapter, ReturnsTheInstancesOfTheObjectManager) {
         EXPECT_EQ(adapter.getCMPIInstance(nullptr), manager.instance(index));
         EXPECT_EQ(adapter.getCMPIInstance(list), manager.instance(index));
         EXPECT_EQ(adapter.getObjectPath(), manager.path(index));
-        EXPECT_EQ(stands(adapter), index < 2) << "whether a further one waits";
+        EXPECT_EQ(hasCurrent(adapter), index < 2) << "whether there is a further instance";
         ++adapter;
     }
 }
@@ -174,9 +174,9 @@ TEST_F(ComputerSystemAdapter, EnumeratesTheClassOfThePathWithAllProperties) {
     CMPILAWComputerSystem adapter(manager.broker(), manager.context(), "root/elsewhere");
     adapter.setObjectPath(manager.classPath());
     EXPECT_EQ(manager.enumerations, 1);
-    EXPECT_EQ(manager.contextGiven, manager.context());
-    EXPECT_EQ(manager.pathGiven, manager.classPath());
-    EXPECT_FALSE(manager.listGiven);
+    EXPECT_EQ(manager.receivedContext, manager.context());
+    EXPECT_EQ(manager.receivedPath, manager.classPath());
+    EXPECT_FALSE(manager.receivedList);
 }
 
 TEST_F(ComputerSystemAdapter, DoesNotCallTheBrokerForANullPath) {
@@ -200,7 +200,7 @@ TEST_F(ComputerSystemAdapter, KeepsTheEnumerationIfTheFirstInstanceCannotBeRead)
     CMPILAWComputerSystem adapter(manager.broker(), manager.context(), "root/cimv2");
     EXPECT_EQ(refusal(adapter, manager.classPath()), noComputer);
     EXPECT_EQ(adapter.getCMPIInstance(nullptr), nullptr);
-    EXPECT_TRUE(stands(adapter)) << "a further one waits";
+    EXPECT_TRUE(hasCurrent(adapter)) << "there is a further instance";
 }
 
 TEST_F(ComputerSystemAdapter, HasNoInstanceIfTheNextCannotBeRead) {
@@ -227,7 +227,7 @@ TEST_F(ComputerSystemAdapter, HasNoPathIfTheInstanceReturnsNone) {
 
 TEST_F(ComputerSystemAdapter, HasNoInstanceIfTheElementIsOfAnotherType) {
     Manager manager(2);
-    manager.give(1, CMPI_string, CMPI_goodValue);
+    manager.setElement(1, CMPI_string, CMPI_goodValue);
     CMPILAWComputerSystem adapter(manager.broker(), manager.context(), "root/cimv2");
     adapter.setObjectPath(manager.classPath());
     ++adapter;
@@ -237,9 +237,9 @@ TEST_F(ComputerSystemAdapter, HasNoInstanceIfTheElementIsOfAnotherType) {
 
 TEST_F(ComputerSystemAdapter, IgnoresTheStateOfElements) {
     Manager manager(3);
-    manager.give(0, CMPI_instance, CMPI_nullValue);
-    manager.give(1, CMPI_instance, CMPI_notFound);
-    manager.give(2, CMPI_instance, CMPI_badValue);
+    manager.setElement(0, CMPI_instance, CMPI_nullValue);
+    manager.setElement(1, CMPI_instance, CMPI_notFound);
+    manager.setElement(2, CMPI_instance, CMPI_badValue);
     CMPILAWComputerSystem adapter(manager.broker(), manager.context(), "root/cimv2");
     adapter.setObjectPath(manager.classPath());
     for (const std::size_t index : {0U, 1U, 2U}) {

@@ -19,14 +19,14 @@ protected:
      * Returns the messages that a function logs during an operation. Expects the source file's logger and flow level.
      */
     template <class Operation>
-    static std::vector<std::string> told(const std::string& function, Operation operation) {
+    static std::vector<std::string> loggedBy(const std::string& function, Operation operation) {
         agentEnvironment::forgetLog();
         operation();
         for (const LogRecord& record : recordsOf(source(), function)) {
             EXPECT_EQ(record.logger, "Tarvik.LeaseAndWarrantyProvider");
             EXPECT_EQ(record.level, 4000);
         }
-        return textsOf(source(), function);
+        return logMessagesOf(source(), function);
     }
 
     static std::vector<std::string> entryAndExit(const std::string& function, const std::string& list = {}) {
@@ -37,45 +37,48 @@ protected:
 TYPED_TEST_SUITE(ElementTrace, ElementKinds, KindNames);
 
 TYPED_TEST(ElementTrace, LogsConstructionAndDestruction) {
-    EXPECT_EQ(this->told(this->named(""), [] { typename TypeParam::Element element; }),
+    EXPECT_EQ(this->loggedBy(this->named(""), [] { typename TypeParam::Element element; }),
               this->entryAndExit(this->named("")));
-    EXPECT_EQ(this->told(this->named("~"), [] { typename TypeParam::Element element; }),
+    EXPECT_EQ(this->loggedBy(this->named("~"), [] { typename TypeParam::Element element; }),
               this->entryAndExit(this->named("~")));
 }
 
 TYPED_TEST(ElementTrace, LogsTheNamesOfOperators) {
     this->fill({"A"});
     typename TypeParam::Element element;
-    EXPECT_EQ(this->told("operator bool", [&] { EXPECT_TRUE(stands(element)); }), this->entryAndExit("operator bool"));
-    EXPECT_EQ(this->told("operator++", [&] { ++element; }), this->entryAndExit("operator++"));
+    EXPECT_EQ(this->loggedBy("operator bool", [&] { EXPECT_TRUE(hasCurrent(element)); }),
+              this->entryAndExit("operator bool"));
+    EXPECT_EQ(this->loggedBy("operator++", [&] { ++element; }), this->entryAndExit("operator++"));
 }
 
 TYPED_TEST(ElementTrace, LogsTypeAndValueOfAFilter) {
     this->fill({"A", "B"});
     typename TypeParam::Element element;
-    EXPECT_EQ(this->told("setFilter", [&] { element.setFilter(TypeParam::Element::InstanceIDFilter, "B 1"); }),
+    EXPECT_EQ(this->loggedBy("setFilter", [&] { element.setFilter(TypeParam::Element::InstanceIDFilter, "B 1"); }),
               this->entryAndExit("setFilter", " filterType=0 reference=B 1"));
 }
 
 TYPED_TEST(ElementTrace, LogsEachEvaluation) {
     this->fill({"A", "B"});
     typename TypeParam::Element element;
-    EXPECT_EQ(this->told("evaluate", [&] { element.setFilter(TypeParam::Element::InstanceIDFilter, "B"); }).size(), 4U);
+    EXPECT_EQ(this->loggedBy("evaluate", [&] { element.setFilter(TypeParam::Element::InstanceIDFilter, "B"); }).size(),
+              4U);
 }
 
 TYPED_TEST(ElementTrace, LogsTheNamesOfCreationRemovalAndGetters) {
     typename TypeParam::Element element;
-    EXPECT_EQ(this->told(this->named("create"), [&] { TypeParam::create(element, "A"); }),
+    EXPECT_EQ(this->loggedBy(this->named("create"), [&] { TypeParam::create(element, "A"); }),
               this->entryAndExit(this->named("create"), " instanceId=A"));
     element.setFilter(TypeParam::Element::InstanceIDFilter, "A");
-    EXPECT_EQ(this->told(this->named("remove"), [&] { TypeParam::remove(element); }),
+    EXPECT_EQ(this->loggedBy(this->named("remove"), [&] { TypeParam::remove(element); }),
               this->entryAndExit(this->named("remove")));
     std::string text;
-    EXPECT_EQ(this->told("getInstanceID", [&] { element.getInstanceID(text); }), this->entryAndExit("getInstanceID"));
-    EXPECT_EQ(this->told("getElementName", [&] { element.getElementName(text); }),
+    EXPECT_EQ(this->loggedBy("getInstanceID", [&] { element.getInstanceID(text); }),
+              this->entryAndExit("getInstanceID"));
+    EXPECT_EQ(this->loggedBy("getElementName", [&] { element.getElementName(text); }),
               this->entryAndExit("getElementName"));
-    EXPECT_EQ(this->told("getCaption", [&] { element.getCaption(text); }), this->entryAndExit("getCaption"));
-    EXPECT_EQ(this->told("getDescription", [&] { element.getDescription(text); }),
+    EXPECT_EQ(this->loggedBy("getCaption", [&] { element.getCaption(text); }), this->entryAndExit("getCaption"));
+    EXPECT_EQ(this->loggedBy("getDescription", [&] { element.getDescription(text); }),
               this->entryAndExit("getDescription"));
 }
 
@@ -96,7 +99,7 @@ TYPED_TEST(ElementTrace, LogsNoExitOfAFailedGetter) {
     typename TypeParam::Element element;
     std::string text;
     EXPECT_THAT(
-        this->told("getInstanceID", [&] { EXPECT_THROW(element.getInstanceID(text), InstrumentationException); }),
+        this->loggedBy("getInstanceID", [&] { EXPECT_THROW(element.getInstanceID(text), InstrumentationException); }),
         ElementsAre(entering("getInstanceID", this->source())));
 }
 
@@ -109,11 +112,11 @@ TEST_F(LeaseTrace, LogsTheNamesOfPropertyAccessors) {
     std::string text;
     unsigned int number = 0;
     bool flag = false;
-    EXPECT_EQ(told("getLessor", [&] { lease.getLessor(text); }), entryAndExit("getLessor"));
-    EXPECT_EQ(told("setBaseRent", [&] { lease.setBaseRent("100"); }), entryAndExit("setBaseRent"));
-    EXPECT_EQ(told("getLeaseTerm", [&] { lease.getLeaseTerm(number); }), entryAndExit("getLeaseTerm"));
-    EXPECT_EQ(told("setRenewalOption", [&] { lease.setRenewalOption(true); }), entryAndExit("setRenewalOption"));
-    EXPECT_EQ(told("getBargainRenewalOption", [&] { lease.getBargainRenewalOption(flag); }),
+    EXPECT_EQ(loggedBy("getLessor", [&] { lease.getLessor(text); }), entryAndExit("getLessor"));
+    EXPECT_EQ(loggedBy("setBaseRent", [&] { lease.setBaseRent("100"); }), entryAndExit("setBaseRent"));
+    EXPECT_EQ(loggedBy("getLeaseTerm", [&] { lease.getLeaseTerm(number); }), entryAndExit("getLeaseTerm"));
+    EXPECT_EQ(loggedBy("setRenewalOption", [&] { lease.setRenewalOption(true); }), entryAndExit("setRenewalOption"));
+    EXPECT_EQ(loggedBy("getBargainRenewalOption", [&] { lease.getBargainRenewalOption(flag); }),
               entryAndExit("getBargainRenewalOption"));
 }
 
@@ -122,10 +125,10 @@ TEST_F(WarrantyTrace, LogsTheNamesOfPropertyAccessors) {
     KO::LeaseWarrantyProvider::Warranty warranty;
     std::string text;
     unsigned int number = 0;
-    EXPECT_EQ(told("getWarrantor", [&] { warranty.getWarrantor(text); }), entryAndExit("getWarrantor"));
-    EXPECT_EQ(told("setCommencementDate", [&] { warranty.setCommencementDate("x"); }),
+    EXPECT_EQ(loggedBy("getWarrantor", [&] { warranty.getWarrantor(text); }), entryAndExit("getWarrantor"));
+    EXPECT_EQ(loggedBy("setCommencementDate", [&] { warranty.setCommencementDate("x"); }),
               entryAndExit("setCommencementDate"));
-    EXPECT_EQ(told("getDuration", [&] { warranty.getDuration(number); }), entryAndExit("getDuration"));
+    EXPECT_EQ(loggedBy("getDuration", [&] { warranty.getDuration(number); }), entryAndExit("getDuration"));
 }
 
 }  // namespace

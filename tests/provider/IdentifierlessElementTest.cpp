@@ -67,7 +67,7 @@ TYPED_TEST(IdentifierlessElement, ThrowsWhenComparedWithAnIdentifier) {
               TypeParam::refusal);
     EXPECT_EQ(thrown<InstrumentationException>([&] { element.evaluate(); }), TypeParam::refusal);
     const auto records = recordsOf(TypeParam::sourceFile, "evaluate");
-    ASSERT_EQ(records.size(), 4U) << "twice an entry and no exit";
+    ASSERT_EQ(records.size(), 4U) << "two entries and no exit";
     for (const std::size_t failed : {1U, 3U}) {
         EXPECT_EQ(withoutLine(records[failed].text), message(TypeParam::refusal, TypeParam::sourceFile));
         EXPECT_EQ(records[failed].level, 3000);

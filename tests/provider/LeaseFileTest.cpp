@@ -118,7 +118,7 @@ TEST_F(LeaseFile, AcceptsFlagsWithASignOrLeadingZeros) {
             SCOPED_TRACE(text);
             const auto cache = load(damaged(lineOfFirstFlag + flag, text));
             EXPECT_EQ(cache->table.at(0).*flags[flag], value);
-            EXPECT_EQ(cache->table.at(1).InstanceID, "B") << "reading goes on";
+            EXPECT_EQ(cache->table.at(1).InstanceID, "B") << "reading continues";
         }
     }
 }

@@ -10,13 +10,13 @@
 namespace {
 
 /** Throws instead of returning the data directory; null for none. */
-void (*insteadOfNaming)() = nullptr;
+void (*insteadOfDataDirectory)() = nullptr;
 
 }  // namespace
 
 const char* KO::PlatformUtilities::getKelsaDataDir() {
-    if (insteadOfNaming != nullptr) {
-        insteadOfNaming();
+    if (insteadOfDataDirectory != nullptr) {
+        insteadOfDataDirectory();
     }
     static const std::string directory = agentEnvironment::dataDirectory().string() + "/";
     return directory.c_str();
@@ -35,7 +35,7 @@ protected:
         write(this->path(), std::string("1\nA\n") + Kind::defaultRecord);
     }
     void TearDown() override {
-        insteadOfNaming = nullptr;
+        insteadOfDataDirectory = nullptr;
         RecordStore<Kind>::TearDown();
     }
 };
@@ -43,14 +43,14 @@ protected:
 TYPED_TEST_SUITE(LoadFailure, RecordKinds, KindNames);
 
 TYPED_TEST(LoadFailure, LeavesAnEmptyTableAndIsLoggedAtErrorLevel) {
-    insteadOfNaming = [] { throw std::runtime_error("no directory"); };
+    insteadOfDataDirectory = [] { throw std::runtime_error("no directory"); };
     agentEnvironment::forgetLog();
     typename TypeParam::Cache cache;
     EXPECT_EQ(TypeParam::count(cache), 0U);
     EXPECT_TRUE(cache.table.empty());
     const std::string function = std::string(TypeParam::name) + "Cache";
     const std::string source = Words<TypeParam>::sourceFile;
-    EXPECT_THAT(textsOf(source, function),
+    EXPECT_THAT(logMessagesOf(source, function),
                 ElementsAre(entering(function, source), message("no directory", source), exiting(function, source)));
     for (const char* channel : {"log", "trace"}) {
         const auto records = recordsOf(source, function, channel);
@@ -61,9 +61,9 @@ TYPED_TEST(LoadFailure, LeavesAnEmptyTableAndIsLoggedAtErrorLevel) {
 }
 
 TYPED_TEST(LoadFailure, DoesNotAffectTheNextLoad) {
-    insteadOfNaming = [] { throw KO::FrameworkException("not now"); };
+    insteadOfDataDirectory = [] { throw KO::FrameworkException("not now"); };
     { typename TypeParam::Cache failed; }
-    insteadOfNaming = nullptr;
+    insteadOfDataDirectory = nullptr;
     typename TypeParam::Cache cache;
     EXPECT_EQ(TypeParam::count(cache), 1U);
     ASSERT_EQ(cache.table.size(), 1U);

@@ -60,7 +60,7 @@ protected:
     }
 
     /** Limits the physical memory to about a number of records. @return the exact number of records that fit */
-    static std::size_t holdRecords(std::size_t count) {
+    static std::size_t limitMemoryToRecords(std::size_t count) {
         const auto page = static_cast<std::size_t>(sysconf(_SC_PAGESIZE));
         physicalPages = static_cast<long>(count * sizeof(Unit) / page + 1);
         return static_cast<std::size_t>(physicalPages) * page / sizeof(Unit);
@@ -99,12 +99,12 @@ protected:
 TYPED_TEST_SUITE(LoadMemory, RecordKinds, KindNames);
 
 TYPED_TEST(LoadMemory, LogsACountOfRecordsThatExceedsMemory) {
-    const std::size_t fitting = this->holdRecords(40);
+    const std::size_t fitting = this->limitMemoryToRecords(40);
     this->expectTooLarge(this->fileOf(fitting + 1));
 }
 
 TYPED_TEST(LoadMemory, LogsACountOfCopiesThatExceedsMemory) {
-    const std::size_t fitting = this->holdRecords(40);
+    const std::size_t fitting = this->limitMemoryToRecords(40);
     this->expectTooLarge(std::to_string(fitting) + "\n" + std::string(1000, 'x'));
 }
 
@@ -114,7 +114,7 @@ TYPED_TEST(LoadMemory, LogsAFailedAllocation) {
 }
 
 TYPED_TEST(LoadMemory, LoadsAllRecordsIfMemoryIsTooSmallForTheReserve) {
-    const std::size_t fitting = this->holdRecords(40);
+    const std::size_t fitting = this->limitMemoryToRecords(40);
     const auto cache = this->load(this->fileOf(fitting));
     EXPECT_EQ(TypeParam::count(*cache), fitting);
     ASSERT_EQ(cache->table.size(), fitting);

@@ -72,7 +72,7 @@ TYPED_TEST(Loading, OfAMissingFileLeavesCursorsAtTheEnd) {
     {
         typename TypeParam::Base base;
         EXPECT_TRUE(this->atEnd(base));
-        EXPECT_FALSE(stands(base));
+        EXPECT_FALSE(hasCurrent(base));
         expectNoProperty<TypeParam>(base, std::string(TypeParam::name) + " record not available");
     }
     EXPECT_FALSE(std::filesystem::exists(this->path()));
@@ -241,7 +241,7 @@ TYPED_TEST(Loading, WithoutADataDirectoryYieldsAnEmptyTable) {
 }
 
 /** Returns pseudorandom bytes that depend only on the seed. */
-std::string rubbish(unsigned int seed, std::size_t length) {
+std::string randomBytes(unsigned int seed, std::size_t length) {
     std::string bytes;
     while (bytes.size() < length) {
         seed = seed * 1664525U + 1013904223U;
@@ -253,9 +253,9 @@ std::string rubbish(unsigned int seed, std::size_t length) {
 TYPED_TEST(Loading, SurvivesRandomBytes) {
     for (unsigned int seed = 1; seed <= 20; ++seed) {
         SCOPED_TRACE(seed);
-        const auto bare = this->load(rubbish(seed, 2000));
+        const auto bare = this->load(randomBytes(seed, 2000));
         EXPECT_EQ(TypeParam::count(*bare), bare->table.size());
-        const auto counted = this->load("7\n" + rubbish(seed, 2000));
+        const auto counted = this->load("7\n" + randomBytes(seed, 2000));
         EXPECT_EQ(this->identifiers(*counted).size(), 7U);
         counted->flushCache();
         EXPECT_EQ(this->file().substr(0, 2), "7\n");

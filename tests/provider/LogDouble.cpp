@@ -8,7 +8,7 @@
 namespace logDouble {
 
 std::vector<std::string> records;
-int buffersMade = 0;
+int buffersCreated = 0;
 int admittedLevel = 0;
 
 }  // namespace logDouble
@@ -36,7 +36,7 @@ struct RZMessageBuffer::Implementation {
 };
 
 RZMessageBuffer::RZMessageBuffer() : implementation(std::make_unique<Implementation>()) {
-    ++logDouble::buffersMade;
+    ++logDouble::buffersCreated;
 }
 
 RZMessageBuffer::~RZMessageBuffer() = default;

@@ -10,7 +10,7 @@ namespace logDouble {
 extern std::vector<std::string> records;
 
 /** Number of constructed message buffers. */
-extern int buffersMade;
+extern int buffersCreated;
 
 /** Maximum level for which the library admits records, if it provides RZLogger::admits. */
 extern int admittedLevel;

@@ -35,10 +35,10 @@ protected:
         store.count = 1;
         EXPECT_EQ((this->*request)(store.className), CMPI_RC_OK);
         store.count = 0;
-        EXPECT_THAT(events, IsEmpty()) << "nothing is returned, not even the end";
+        EXPECT_THAT(events, IsEmpty()) << "nothing is returned, and no done";
         EXPECT_THAT(errorsOf(store.storeFile, store.cursor), ElementsAre(message(store.noRecords, store.storeFile)));
         EXPECT_THAT(errorsOf(entryFile, entryPoint), ElementsAre(message(store.noRecords, entryFile)));
-        EXPECT_EQ(texts().back(), std::string(78, '='));
+        EXPECT_EQ(logMessages().back(), std::string(78, '='));
     }
 
     static std::vector<std::string> errorsOf(const std::string& file, const std::string& function) {

@@ -32,7 +32,7 @@ TYPED_TEST(SettingElement, FailsOnAnUnnamedComputerBeforeTheMatch) {
                   }),
                   "Name Property on Computer Node not available.");
     }
-    EXPECT_EQ(textsOf(TypeParam::elementFile, "setFilter").size(), 0U);
+    EXPECT_EQ(logMessagesOf(TypeParam::elementFile, "setFilter").size(), 0U);
 }
 
 TYPED_TEST(SettingElement, IgnoresAnUnnamedComputerAfterTheMatch) {

@@ -72,12 +72,12 @@ TEST_F(OstrelAgentElement, HasNoSuffixIfAFileWithAnotherNameExists) {
 
 TEST_F(OstrelAgentElement, ExistsExactlyOnce) {
     OstrelAgent agent;
-    EXPECT_TRUE(stands(agent));
-    EXPECT_TRUE(stands(agent));
+    EXPECT_TRUE(hasCurrent(agent));
+    EXPECT_TRUE(hasCurrent(agent));
     ++agent;
-    EXPECT_FALSE(stands(agent));
+    EXPECT_FALSE(hasCurrent(agent));
     ++agent;
-    EXPECT_FALSE(stands(agent));
+    EXPECT_FALSE(hasCurrent(agent));
 }
 
 TEST_F(OstrelAgentElement, AcceptsItsOwnKeysAndRejectsOthers) {
@@ -117,21 +117,21 @@ TEST_F(OstrelAgentElement, AcceptsAnyValueOfAnUnknownKey) {
 TEST_F(OstrelAgentElement, IsUnchangedByFilters) {
     OstrelAgent agent;
     agent.setFilter(OstrelAgent::FILTER_VENDOR, "VEL");
-    EXPECT_TRUE(stands(agent));
+    EXPECT_TRUE(hasCurrent(agent));
     EXPECT_THROW(agent.setFilter(OstrelAgent::FILTER_VENDOR, "other"), InstrumentationException);
-    EXPECT_TRUE(stands(agent));
+    EXPECT_TRUE(hasCurrent(agent));
     agent.setFilter(static_cast<OstrelAgent::FilterType>(7), "other");
-    EXPECT_TRUE(stands(agent));
+    EXPECT_TRUE(hasCurrent(agent));
     ++agent;
     agent.setFilter(OstrelAgent::FILTER_VENDOR, "VEL");
-    EXPECT_FALSE(stands(agent));
+    EXPECT_FALSE(hasCurrent(agent));
 }
 
 TEST_F(OstrelAgentElement, LogsFiltersAtErrorLevel) {
     OstrelAgent agent;
     agentEnvironment::forgetLog();
     agent.setFilter(OstrelAgent::FILTER_VERSION, "4.2.0-Beta");
-    EXPECT_THAT(textsOf(sourceFile, "setFilter"),
+    EXPECT_THAT(logMessagesOf(sourceFile, "setFilter"),
                 ElementsAre(entering("setFilter", sourceFile, "FilterType=4 key_value=4.2.0-Beta"),
                             exiting("setFilter", sourceFile, "FilterType=4 key_value=4.2.0-Beta")));
     for (const LogRecord& record : recordsOf(sourceFile, "setFilter")) {
@@ -142,7 +142,7 @@ TEST_F(OstrelAgentElement, LogsFiltersAtErrorLevel) {
 
 TEST_F(OstrelAgentElement, LogsTheReasonOfAFailedFilterAndNoExit) {
     refusal(OstrelAgent::FILTER_VENDOR, "other");
-    EXPECT_THAT(textsOf(sourceFile, "setFilter"),
+    EXPECT_THAT(logMessagesOf(sourceFile, "setFilter"),
                 ElementsAre(entering("setFilter", sourceFile, "FilterType=3 key_value=other"),
                             message("Could not find specified Agent.", sourceFile)));
     for (const LogRecord& record : recordsOf(sourceFile, "setFilter")) {
@@ -153,7 +153,7 @@ TEST_F(OstrelAgentElement, LogsTheReasonOfAFailedFilterAndNoExit) {
 TEST_F(OstrelAgentElement, LogsEntryAndExitOfItsOperations) {
     agentEnvironment::forgetLog();
     OstrelAgent agent;
-    EXPECT_TRUE(stands(agent));
+    EXPECT_TRUE(hasCurrent(agent));
     ++agent;
     agent.getBuildNumber();
     std::vector<std::string> expected;
@@ -161,8 +161,8 @@ TEST_F(OstrelAgentElement, LogsEntryAndExitOfItsOperations) {
         expected.push_back(entering(function, sourceFile));
         expected.push_back(exiting(function, sourceFile));
     }
-    EXPECT_EQ(texts("log"), expected);
-    EXPECT_EQ(texts("trace"), expected);
+    EXPECT_EQ(logMessages("log"), expected);
+    EXPECT_EQ(logMessages("trace"), expected);
     for (const LogRecord& record : agentEnvironment::log()) {
         EXPECT_EQ(record.level, 4000);
         EXPECT_EQ(record.logger, "Tarvik.LeaseWarrantyProvider");

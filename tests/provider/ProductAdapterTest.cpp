@@ -23,16 +23,16 @@ using KO::LeaseWarrantyProvider::CMPIOstrelAgent;
 class ProductAdapter : public CleanAgent {
 protected:
     /** The values of a key, and the namespaces, of an adapter's paths. */
-    struct Walked {
+    struct VisitedPaths {
         std::vector<std::string> keys{};
         std::vector<std::string> nameSpaces{};
         std::size_t instances = 0;
     };
 
     template <class Adapter>
-    Walked walked(const char* key) {
+    VisitedPaths visited(const char* key) {
         Adapter adapter(broker.handle(), nullptr, std::string("root/elsewhere"));
-        Walked found;
+        VisitedPaths found;
         for (; adapter; ++adapter) {
             std::string value = "(none)";
             const CMPIObjectPath* path = adapter.getObjectPath();
@@ -49,23 +49,23 @@ protected:
 };
 
 TEST_F(ProductAdapter, OfANamespaceReturnsTheAgentWithoutComparingKeys) {
-    const Walked found = walked<CMPIOstrelAgent>("Name");
+    const VisitedPaths found = visited<CMPIOstrelAgent>("Name");
     EXPECT_THAT(found.keys, ElementsAre("Test Agent"));
     EXPECT_THAT(found.nameSpaces, Each("root/elsewhere"));
     EXPECT_EQ(found.instances, 1U);
-    EXPECT_THAT(textsOf("OstrelAgent.cpp", "setFilter"), IsEmpty());
-    EXPECT_THAT(textsOf("CMPIOstrelAgent.cpp", "setObjectPath"), IsEmpty());
+    EXPECT_THAT(logMessagesOf("OstrelAgent.cpp", "setFilter"), IsEmpty());
+    EXPECT_THAT(logMessagesOf("CMPIOstrelAgent.cpp", "setObjectPath"), IsEmpty());
 }
 
 TEST_F(ProductAdapter, OfANamespaceReturnsOneAssetInstancePerComputer) {
-    const Walked found = walked<CMPIAssetIDDetail>("Name");
+    const VisitedPaths found = visited<CMPIAssetIDDetail>("Name");
     EXPECT_THAT(found.keys, ElementsAre("spaced", "tight", "dashless", "dash first", "dash second", "many dashes",
                                         "empty", "productless", "/system%20one"))
-        << "the last has no name: the key before it is shown";
+        << "the last has no name and repeats the preceding key";
     EXPECT_THAT(found.nameSpaces, Each("root/elsewhere"));
     EXPECT_EQ(found.instances, 9U);
-    EXPECT_THAT(textsOf("AssetIDDetails.cpp", "setFilter"), IsEmpty());
-    EXPECT_THAT(textsOf("CMPIAssetIDDetail.cpp", "setObjectPath"), IsEmpty());
+    EXPECT_THAT(logMessagesOf("AssetIDDetails.cpp", "setFilter"), IsEmpty());
+    EXPECT_THAT(logMessagesOf("CMPIAssetIDDetail.cpp", "setObjectPath"), IsEmpty());
 }
 
 }  // namespace

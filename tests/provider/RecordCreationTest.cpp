@@ -43,7 +43,7 @@ TYPED_TEST(RecordCreation, MovesTheCursorFromARecordToTheNewOne) {
     TypeParam::create(base, "C");
     EXPECT_EQ(this->identifier(base), "C");
     ++base;
-    EXPECT_FALSE(stands(base));
+    EXPECT_FALSE(hasCurrent(base));
 }
 
 TYPED_TEST(RecordCreation, MovesTheCursorFromTheEndToTheFirstEntry) {
@@ -58,7 +58,7 @@ TYPED_TEST(RecordCreation, MovesTheCursorToTheOnlyRecord) {
     typename TypeParam::Base base;
     TypeParam::create(base, "A");
     EXPECT_EQ(this->identifier(base), "A");
-    EXPECT_TRUE(stands(base));
+    EXPECT_TRUE(hasCurrent(base));
     EXPECT_EQ(this->identifier(base), "A");
 }
 
@@ -69,7 +69,7 @@ TYPED_TEST(RecordCreation, MovesTheCursorFromTheEndToADeletedFirstEntry) {
     typename TypeParam::Base base;
     TypeParam::create(base, "C");
     EXPECT_EQ(this->identifier(base), "A");
-    EXPECT_TRUE(stands(base));
+    EXPECT_TRUE(hasCurrent(base));
     EXPECT_EQ(this->identifier(base), "C");
 }
 
@@ -120,7 +120,7 @@ TYPED_TEST(RecordCreation, AcceptsTheIdentifierOfADeletedRecord) {
     EXPECT_TRUE(TypeParam::create(base, "A"));
     EXPECT_THAT(this->entries(), ElementsAre("|A", "B", "A"));
     ++base;
-    EXPECT_FALSE(stands(base));
+    EXPECT_FALSE(hasCurrent(base));
 }
 
 TYPED_TEST(RecordCreation, IsWrittenWhenTheCursorIsDestroyed) {
@@ -146,7 +146,7 @@ TYPED_TEST(RecordCreation, AndDeletionLeaveOnlyTheCountInTheFile) {
     EXPECT_EQ(this->count(), 0U);
     typename TypeParam::Base fresh;
     EXPECT_TRUE(this->atEnd(fresh));
-    EXPECT_FALSE(stands(fresh));
+    EXPECT_FALSE(hasCurrent(fresh));
 }
 
 TYPED_TEST(RecordCreation, OfDeletedRecordsIsNotWritten) {
@@ -168,7 +168,7 @@ TYPED_TEST(RecordCreation, DeletionDoesNotMoveTheCursor) {
     std::string text = "before";
     EXPECT_TRUE(base.getProperty(TypeParam::text, text));
     EXPECT_EQ(text, "");
-    EXPECT_TRUE(stands(base));
+    EXPECT_TRUE(hasCurrent(base));
     EXPECT_EQ(this->identifier(base), "B");
 }
 

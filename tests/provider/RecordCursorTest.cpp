@@ -13,7 +13,7 @@ template <class Kind>
 class RecordCursor : public RecordStore<Kind> {
 protected:
     /** Returns the identifiers from the current record on. */
-    static std::vector<std::string> walked(typename Kind::Base& base) {
+    static std::vector<std::string> visited(typename Kind::Base& base) {
         std::vector<std::string> identifiers;
         for (; base; ++base) {
             identifiers.push_back(RecordStore<Kind>::identifier(base));
@@ -26,7 +26,7 @@ TYPED_TEST_SUITE(RecordCursor, RecordKinds, KindNames);
 
 TYPED_TEST(RecordCursor, StartsAtTheEndOfAnEmptyTable) {
     typename TypeParam::Base base;
-    EXPECT_FALSE(stands(base));
+    EXPECT_FALSE(hasCurrent(base));
     EXPECT_TRUE(this->atEnd(base));
 }
 
@@ -35,7 +35,7 @@ TYPED_TEST(RecordCursor, StartsAtTheFirstRecordInUse) {
     this->markDeleted(0);
     typename TypeParam::Base base;
     EXPECT_EQ(this->identifier(base), "B");
-    EXPECT_TRUE(stands(base));
+    EXPECT_TRUE(hasCurrent(base));
 }
 
 TYPED_TEST(RecordCursor, StartsAtTheEndIfTheCountIsZero) {
@@ -43,7 +43,7 @@ TYPED_TEST(RecordCursor, StartsAtTheEndIfTheCountIsZero) {
     this->count() = 0;
     typename TypeParam::Base base;
     EXPECT_TRUE(this->atEnd(base));
-    EXPECT_FALSE(stands(base));
+    EXPECT_FALSE(hasCurrent(base));
 }
 
 TYPED_TEST(RecordCursor, ThrowsIfTheCountIsNotZeroAndTheTableIsEmpty) {
@@ -70,17 +70,17 @@ TYPED_TEST(RecordCursor, VisitsTheRecordsInUseInTableOrder) {
     this->markDeleted(2);
     this->markDeleted(4);
     typename TypeParam::Base base;
-    EXPECT_THAT(this->walked(base), ElementsAre("C", "A", "B"));
+    EXPECT_THAT(this->visited(base), ElementsAre("C", "A", "B"));
 }
 
 TYPED_TEST(RecordCursor, StaysAtTheEnd) {
     this->fill({"A"});
     typename TypeParam::Base base;
     ++base;
-    EXPECT_FALSE(stands(base));
+    EXPECT_FALSE(hasCurrent(base));
     ++base;
     ++base;
-    EXPECT_FALSE(stands(base));
+    EXPECT_FALSE(hasCurrent(base));
     EXPECT_TRUE(this->atEnd(base));
 }
 
@@ -89,7 +89,7 @@ TYPED_TEST(RecordCursor, StaysAtTheEndWhenARecordIsAppended) {
     typename TypeParam::Base base;
     ++base;
     this->fill({"B"});
-    EXPECT_FALSE(stands(base));
+    EXPECT_FALSE(hasCurrent(base));
 }
 
 TYPED_TEST(RecordCursor, MovesFromADeletedRecordWhenItIsTested) {
@@ -98,7 +98,7 @@ TYPED_TEST(RecordCursor, MovesFromADeletedRecordWhenItIsTested) {
     this->markDeleted(0);
     this->markDeleted(1);
     EXPECT_EQ(this->identifier(base), "A");
-    EXPECT_TRUE(stands(base));
+    EXPECT_TRUE(hasCurrent(base));
     EXPECT_EQ(this->identifier(base), "C");
 }
 
@@ -108,7 +108,7 @@ TYPED_TEST(RecordCursor, MovesToTheEndWhenOnlyDeletedRecordsFollow) {
     this->markDeleted(0);
     this->markDeleted(1);
     EXPECT_FALSE(this->atEnd(base));
-    EXPECT_FALSE(stands(base));
+    EXPECT_FALSE(hasCurrent(base));
     EXPECT_TRUE(this->atEnd(base));
 }
 
@@ -117,7 +117,7 @@ TYPED_TEST(RecordCursor, SelectsARecordByItsIdentifier) {
     typename TypeParam::Base base;
     TypeParam::select(base, "B");
     EXPECT_EQ(this->identifier(base), "B");
-    EXPECT_THAT(this->walked(base), ElementsAre("B", "C"));
+    EXPECT_THAT(this->visited(base), ElementsAre("B", "C"));
 }
 
 TYPED_TEST(RecordCursor, SelectsTheCurrentRecord) {
@@ -135,7 +135,7 @@ TYPED_TEST(RecordCursor, SelectsForwardOnly) {
     typename TypeParam::Base base;
     TypeParam::select(base, "C");
     TypeParam::select(base, "B");
-    EXPECT_FALSE(stands(base));
+    EXPECT_FALSE(hasCurrent(base));
     typename TypeParam::Base fresh;
     TypeParam::select(fresh, "B");
     EXPECT_EQ(this->identifier(fresh), "B");
@@ -145,7 +145,7 @@ TYPED_TEST(RecordCursor, ComparesIdentifiersByteForByte) {
     this->fill({"Lease 1", "lease 10", "lease", std::string("lease 1\0x", 9), " lease 1", "lease 1", "lease 1 "});
     typename TypeParam::Base base;
     TypeParam::select(base, "lease 1");
-    EXPECT_THAT(this->walked(base), ElementsAre("lease 1", "lease 1 "));
+    EXPECT_THAT(this->visited(base), ElementsAre("lease 1", "lease 1 "));
 }
 
 TYPED_TEST(RecordCursor, MovesToTheEndIfNoRecordHasTheIdentifier) {
@@ -164,7 +164,7 @@ TYPED_TEST(RecordCursor, SelectsNoDeletedRecord) {
     TypeParam::select(base, "B");
     EXPECT_EQ(this->identifier(base), "B");
     ++base;
-    EXPECT_FALSE(stands(base));
+    EXPECT_FALSE(hasCurrent(base));
     this->markDeleted(2);
     typename TypeParam::Base second;
     TypeParam::select(second, "B");
@@ -190,7 +190,7 @@ TYPED_TEST(RecordCursor, IsNotAffectedByRecordsThatAnotherCursorAppends) {
         }
     }
     EXPECT_EQ(this->identifier(base), "B");
-    EXPECT_EQ(this->walked(base).size(), 101U);
+    EXPECT_EQ(this->visited(base).size(), 101U);
 }
 
 TYPED_TEST(RecordCursor, SeesChangesOfAnotherCursorAtOnce) {
@@ -202,7 +202,7 @@ TYPED_TEST(RecordCursor, SeesChangesOfAnotherCursorAtOnce) {
     second.getProperty(TypeParam::text, text);
     EXPECT_EQ(text, "changed");
     TypeParam::remove(second);
-    EXPECT_FALSE(stands(first));
+    EXPECT_FALSE(hasCurrent(first));
 }
 
 }  // namespace

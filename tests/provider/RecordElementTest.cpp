@@ -22,7 +22,7 @@ protected:
     }
 
     /** Returns the identifiers from the current record on. */
-    static std::vector<std::string> walked(Element& element) {
+    static std::vector<std::string> visited(Element& element) {
         std::vector<std::string> identifiers;
         for (; element; ++element) {
             identifiers.push_back(identifier(element));
@@ -39,13 +39,13 @@ TYPED_TEST(RecordElement, StartsAtTheFirstRecordInUse) {
     this->fill({"L1", "L2"});
     this->markDeleted(0);
     typename TypeParam::Element element;
-    EXPECT_TRUE(stands(element));
+    EXPECT_TRUE(hasCurrent(element));
     EXPECT_EQ(this->identifier(element), "L2");
 }
 
 TYPED_TEST(RecordElement, HasNoCurrentRecordWithoutRecords) {
     typename TypeParam::Element element;
-    EXPECT_FALSE(stands(element));
+    EXPECT_FALSE(hasCurrent(element));
 }
 
 TYPED_TEST(RecordElement, ThrowsIfTheCountIsNotZeroAndTheTableIsEmpty) {
@@ -59,7 +59,7 @@ TYPED_TEST(RecordElement, VisitsEveryRecordInUseWithoutAFilter) {
     this->markDeleted(1);
     this->markDeleted(4);
     typename TypeParam::Element element;
-    EXPECT_THAT(this->walked(element), ElementsAre("L3", "L1", "L2"));
+    EXPECT_THAT(this->visited(element), ElementsAre("L3", "L1", "L2"));
 }
 
 TYPED_TEST(RecordElement, VisitsOnlyTheRecordOfTheFilter) {
@@ -68,7 +68,7 @@ TYPED_TEST(RecordElement, VisitsOnlyTheRecordOfTheFilter) {
     element.setFilter(TypeParam::Element::InstanceIDFilter, "L2");
     EXPECT_EQ(this->identifier(element), "L2");
     ++element;
-    EXPECT_FALSE(stands(element));
+    EXPECT_FALSE(hasCurrent(element));
 }
 
 TYPED_TEST(RecordElement, ComparesTheFilterByteForByte) {
@@ -76,7 +76,7 @@ TYPED_TEST(RecordElement, ComparesTheFilterByteForByte) {
     for (const char* reference : {"l1", "l2", "L2", " L1", "L1 ", ""}) {
         typename TypeParam::Element element;
         element.setFilter(TypeParam::Element::InstanceIDFilter, reference);
-        EXPECT_FALSE(stands(element)) << reference;
+        EXPECT_FALSE(hasCurrent(element)) << reference;
     }
 }
 
@@ -84,7 +84,7 @@ TYPED_TEST(RecordElement, FindsARecordWithAnEmptyIdentifier) {
     this->fill({"L1", ""});
     typename TypeParam::Element element;
     element.setFilter(TypeParam::Element::InstanceIDFilter, "");
-    EXPECT_TRUE(stands(element));
+    EXPECT_TRUE(hasCurrent(element));
     EXPECT_EQ(this->identifier(element), "");
 }
 
@@ -92,9 +92,9 @@ TYPED_TEST(RecordElement, PassesNoRecordThroughTwoDifferentFilters) {
     this->fill({"L1", "L2"});
     typename TypeParam::Element element;
     element.setFilter(TypeParam::Element::InstanceIDFilter, "L1");
-    EXPECT_TRUE(stands(element));
+    EXPECT_TRUE(hasCurrent(element));
     element.setFilter(TypeParam::Element::InstanceIDFilter, "L2");
-    EXPECT_FALSE(stands(element));
+    EXPECT_FALSE(hasCurrent(element));
 }
 
 TYPED_TEST(RecordElement, StaysAtTheRecordWhenTheSameFilterIsSetAgain) {
@@ -110,7 +110,7 @@ TYPED_TEST(RecordElement, FiltersFromTheCurrentRecord) {
     typename TypeParam::Element element;
     ++element;
     element.setFilter(TypeParam::Element::InstanceIDFilter, "L1");
-    EXPECT_FALSE(stands(element));
+    EXPECT_FALSE(hasCurrent(element));
 }
 
 TYPED_TEST(RecordElement, PassesEveryRecordThroughAFilterOfAnotherType) {
@@ -118,7 +118,7 @@ TYPED_TEST(RecordElement, PassesEveryRecordThroughAFilterOfAnotherType) {
     this->markDeleted(1);
     typename TypeParam::Element element;
     element.setFilter(this->other, "anything");
-    EXPECT_THAT(this->walked(element), ElementsAre("L1", "L2"));
+    EXPECT_THAT(this->visited(element), ElementsAre("L1", "L2"));
 }
 
 TYPED_TEST(RecordElement, SkipsRecordsThatDoNotPass) {
@@ -126,14 +126,14 @@ TYPED_TEST(RecordElement, SkipsRecordsThatDoNotPass) {
     typename TypeParam::Element element;
     element.setFilter(this->other, "anything");
     element.setFilter(TypeParam::Element::InstanceIDFilter, "same");
-    EXPECT_THAT(this->walked(element), ElementsAre("same", "same"));
+    EXPECT_THAT(this->visited(element), ElementsAre("same", "same"));
 }
 
 TYPED_TEST(RecordElement, SkipsARecordDeletedByAnotherElement) {
     this->fill({"L1", "L2"});
     typename TypeParam::Element element;
     this->markDeleted(0);
-    EXPECT_TRUE(stands(element));
+    EXPECT_TRUE(hasCurrent(element));
     EXPECT_EQ(this->identifier(element), "L2");
 }
 
@@ -178,7 +178,7 @@ TYPED_TEST(RecordElement, RemovesNothingWithoutAFilter) {
     this->fill({"L1"});
     {
         typename TypeParam::Element element;
-        EXPECT_TRUE(stands(element));
+        EXPECT_TRUE(hasCurrent(element));
         EXPECT_EQ(thrown<InstrumentationException>([&] { TypeParam::remove(element); }), this->identify());
     }
     EXPECT_TRUE(this->table()[0].inUse);
@@ -210,7 +210,7 @@ TYPED_TEST(RecordElement, RemovesTheCurrentRecordThroughAFilterOfAnotherType) {
     element.setFilter(this->other, "anything");
     TypeParam::remove(element);
     EXPECT_EQ(this->identifier(element), "L1");
-    EXPECT_TRUE(stands(element));
+    EXPECT_TRUE(hasCurrent(element));
     EXPECT_EQ(this->identifier(element), "L2");
 }
 

@@ -41,7 +41,7 @@ TYPED_TEST(RecordFile, ContainsLineFeedsOfStringsUnescaped) {
         ASSERT_EQ(lines.size(), TypeParam::linesOfRecord + 1);
         EXPECT_EQ(lines[value.line], "two");
         EXPECT_EQ(lines[value.line + 1], "lines");
-        EXPECT_EQ(this->reread(unit).*value.member, "two") << "the rest is taken for what follows";
+        EXPECT_EQ(this->reread(unit).*value.member, "two") << "the rest is read as the next field";
     }
     const typename TypeParam::Unit unit("two\nlines");
     EXPECT_EQ(linesOf(this->written(unit)).size(), TypeParam::linesOfRecord + 1);

@@ -18,7 +18,7 @@ using RequestTrace = RequestTest;
 
 TEST_F(RequestTrace, IsEnclosedBySeparators) {
     enumerate("VELKO_Lease");
-    const auto lines = texts();
+    const auto lines = logMessages();
     ASSERT_GT(lines.size(), 6U);
     EXPECT_EQ(lines[0], rule);
     EXPECT_EQ(lines[1], entering("LeaseAndWarranty_EnumInstances", entryFile));
@@ -84,16 +84,16 @@ TEST_F(RequestTrace, LogsExceptionsAtErrorLevelAndTheExit) {
     ASSERT_FALSE(failures.empty());
     EXPECT_EQ(withoutLine(failures.back().text), message("Could not find specified Agent.", entryFile));
     EXPECT_EQ(failures.back().level, 3000);
-    const auto lines = texts();
+    const auto lines = logMessages();
     EXPECT_EQ(lines[lines.size() - 2], exiting("LeaseAndWarranty_GetInstance", entryFile));
     EXPECT_EQ(lines.back(), rule);
 }
 
 TEST_F(RequestTrace, OfAnUnknownClassContainsNoFurtherLines) {
     enumerate("VELKO_Unheard");
-    EXPECT_THAT(texts(), ElementsAre(rule, entering("LeaseAndWarranty_EnumInstances", entryFile),
-                                     variable("classId", "0", entryFile),
-                                     exiting("LeaseAndWarranty_EnumInstances", entryFile), rule));
+    EXPECT_THAT(logMessages(), ElementsAre(rule, entering("LeaseAndWarranty_EnumInstances", entryFile),
+                                           variable("classId", "0", entryFile),
+                                           exiting("LeaseAndWarranty_EnumInstances", entryFile), rule));
 }
 
 }  // namespace

@@ -26,7 +26,7 @@ protected:
     }
 
     /** Expects that the destructor logged the failure to rewrite the file at error level. */
-    static void expectRewriteFailureTold() {
+    static void expectRewriteFailureLogged() {
         const auto records = recordsOf(Words<Kind>::sourceFile, std::string("~") + Kind::name + "Base");
         const auto failure =
             std::find_if(records.begin(), records.end(), [](const LogRecord& record) { return record.level == 3000; });
@@ -52,11 +52,11 @@ TYPED_TEST(Rewrite, DoesNotHappenAfterReading) {
     write(this->path(), "edited by somebody else");
     {
         typename TypeParam::Base base;
-        EXPECT_TRUE(stands(base));
+        EXPECT_TRUE(hasCurrent(base));
         EXPECT_EQ(this->identifier(base), "A");
         TypeParam::select(base, "A");
         ++base;
-        EXPECT_FALSE(stands(base));
+        EXPECT_FALSE(hasCurrent(base));
     }
     EXPECT_EQ(this->file(), "edited by somebody else");
 }
@@ -85,7 +85,7 @@ TYPED_TEST(Rewrite, HappensOnceForManyChanges) {
         TypeParam::create(base, "B");
         TypeParam::remove(base);
     }
-    EXPECT_THAT(textsOf(Words<TypeParam>::sourceFile, "flushCache"),
+    EXPECT_THAT(logMessagesOf(Words<TypeParam>::sourceFile, "flushCache"),
                 testing::ElementsAre(entering("flushCache", Words<TypeParam>::sourceFile),
                                      variable(Words<TypeParam>::countName, "1", Words<TypeParam>::sourceFile),
                                      exiting("flushCache", Words<TypeParam>::sourceFile)));
@@ -214,7 +214,7 @@ TYPED_TEST(Rewrite, ThatFailsDuringUnwindingIsOnlyLogged) {
                   throw std::runtime_error("the first one");
               }),
               "the first one");
-    this->expectRewriteFailureTold();
+    this->expectRewriteFailureLogged();
     EXPECT_EQ(this->table().at(0).*TypeParam::textMember, "ACME");
 }
 
@@ -260,7 +260,7 @@ TYPED_TEST(Rewrite, ThatFailsDuringNestedUnwindingIsOnlyLogged) {
         });
     });
     EXPECT_EQ(failure, "the first one");
-    this->expectRewriteFailureTold();
+    this->expectRewriteFailureLogged();
 }
 
 TYPED_TEST(Rewrite, HappensDuringUnwinding) {
@@ -286,7 +286,7 @@ TEST_F(BothStores, ShareNoData) {
         LeaseBase lease;
         lease.createLease("same");
         WarrantyBase warranty;
-        EXPECT_FALSE(stands(warranty));
+        EXPECT_FALSE(hasCurrent(warranty));
         warranty.createWarranty("same");
     }
     EXPECT_EQ(contentOf(agentEnvironment::dataDirectory() / "Lease.dat"),

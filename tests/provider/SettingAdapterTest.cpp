@@ -74,8 +74,9 @@ protected:
     static void expectTraced(const char* function, const CMPIObjectPath* source) {
         std::ostringstream list;
         list << " objectPath=" << source;
-        EXPECT_THAT(textsOf(Kind::sourceFile, function), ElementsAre(entering(function, Kind::sourceFile, list.str()),
-                                                                     exiting(function, Kind::sourceFile, list.str())));
+        EXPECT_THAT(logMessagesOf(Kind::sourceFile, function),
+                    ElementsAre(entering(function, Kind::sourceFile, list.str()),
+                                exiting(function, Kind::sourceFile, list.str())));
         for (const LogRecord& record : recordsOf(Kind::sourceFile, function)) {
             EXPECT_EQ(record.level, 3000);
         }

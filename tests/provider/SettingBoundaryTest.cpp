@@ -143,11 +143,11 @@ TYPED_TEST(MonikerBoundary, SkipsAKeyThatCannotBeSelected) {
     monikers().selected = 0;
     monikers().unselectable = {0, 2};
     this->toElement();
-    EXPECT_EQ(textsOf(TypeParam::sourceFile, TypeParam::toElement).at(1),
+    EXPECT_EQ(logMessagesOf(TypeParam::sourceFile, TypeParam::toElement).at(1),
               variable("Name", "testhost", TypeParam::sourceFile));
     monikers().selected = 2;
     this->toComputer();
-    EXPECT_EQ(textsOf(TypeParam::sourceFile, "getComputerMoniker").at(1),
+    EXPECT_EQ(logMessagesOf(TypeParam::sourceFile, "getComputerMoniker").at(1),
               variable("Name", "testhost", TypeParam::sourceFile))
         << "the name of the system";
 }

@@ -99,7 +99,7 @@ TYPED_TEST(SettingElement, SelectsAgainRegardlessOfTheCurrentRecord) {
     const Keys alpha = {{"InstanceID", "/system/first%20box"}};
     const Keys beta = {{"InstanceID", "/system/second%5Fbox"}};
     EXPECT_EQ(toElement("beta"), beta);
-    EXPECT_EQ(toElement("alpha"), alpha) << "the element stands behind its record";
+    EXPECT_EQ(toElement("alpha"), alpha) << "the element is at its record";
     EXPECT_EQ(toComputer("/system/third"), (Keys{{"Name", "beta"}}));
     EXPECT_EQ(toElement("alpha"), alpha);
     EXPECT_EQ(toElement("nobody"), (Keys{{"InstanceID", ""}}));
@@ -132,8 +132,8 @@ TYPED_TEST(SettingElement, MovesToTheRecordOfTheComputer) {
     Moniker argument = moniker({{"Name", "beta"}});
     agentEnvironment::forgetLog();
     TypeParam::elementMoniker(fresh, argument);
-    const auto evaluations = textsOf(TypeParam::elementFile, "evaluate");
-    EXPECT_EQ(evaluations.size(), 4U) << "the first record is passed over, the second is kept";
+    const auto evaluations = logMessagesOf(TypeParam::elementFile, "evaluate");
+    EXPECT_EQ(evaluations.size(), 4U) << "the first record is skipped, the second is kept";
 }
 
 TYPED_TEST(SettingElement, ThrowsIfTheCountIsNotZeroAndTheTableIsEmpty) {

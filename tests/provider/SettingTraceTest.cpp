@@ -13,12 +13,12 @@ using testing::ElementsAre;
 using testing::ElementsAreArray;
 
 /** Level and message of a record. */
-struct Told {
+struct LoggedRecord {
     int level;
     std::string text;
-    bool operator==(const Told& other) const { return level == other.level && text == other.text; }
-    friend std::ostream& operator<<(std::ostream& stream, const Told& told) {
-        return stream << told.level << ' ' << told.text;
+    bool operator==(const LoggedRecord& other) const { return level == other.level && text == other.text; }
+    friend std::ostream& operator<<(std::ostream& stream, const LoggedRecord& record) {
+        return stream << record.level << ' ' << record.text;
     }
 };
 
@@ -26,8 +26,8 @@ template <class Kind>
 class SettingTrace : public SettingElement<Kind> {
 protected:
     /** Returns the records that a function logged. Expects the source file's logger. */
-    static std::vector<Told> told(const std::string& function) {
-        std::vector<Told> found;
+    static std::vector<LoggedRecord> loggedBy(const std::string& function) {
+        std::vector<LoggedRecord> found;
         for (const LogRecord& record : recordsOf(Kind::sourceFile, function)) {
             EXPECT_EQ(record.logger, "Tarvik.LeaseAndWarrantyProvider");
             found.push_back({record.level, withoutLine(record.text)});
@@ -49,7 +49,7 @@ TYPED_TEST(SettingTrace, LogsConstructionAndDestruction) {
     { typename TypeParam::Setting fresh; }
     for (const char* before : {"", "~"}) {
         const std::string function = std::string(before) + TypeParam::name;
-        EXPECT_THAT(textsOf(TypeParam::sourceFile, function),
+        EXPECT_THAT(logMessagesOf(TypeParam::sourceFile, function),
                     ElementsAre("METHOD: " + function + "() was invoked in " + TypeParam::sourceFile + " [Line: N]"));
         EXPECT_EQ(recordsOf(TypeParam::sourceFile, function).at(0).level, 4000);
     }
@@ -60,7 +60,7 @@ TYPED_TEST(SettingTrace, LogsTheTranslationToTheElement) {
     const std::string list = this->listOf(" monikerComputer=", argument);
     agentEnvironment::forgetLog();
     TypeParam::elementMoniker(this->setting, argument);
-    std::vector<Told> expected = {
+    std::vector<LoggedRecord> expected = {
         {3000, entering(TypeParam::toElement, TypeParam::sourceFile, list)},
         {4000, variable("Name", "beta", TypeParam::sourceFile)},
         {4000, variable("InstanceID", "/system/second%5Fbox", TypeParam::sourceFile)},
@@ -68,7 +68,7 @@ TYPED_TEST(SettingTrace, LogsTheTranslationToTheElement) {
     if (TypeParam::marksExitToElement) {
         expected.push_back({3000, exiting(TypeParam::toElement, TypeParam::sourceFile, list)});
     }
-    EXPECT_THAT(this->told(TypeParam::toElement), ElementsAreArray(expected));
+    EXPECT_THAT(this->loggedBy(TypeParam::toElement), ElementsAreArray(expected));
 }
 
 TYPED_TEST(SettingTrace, LogsTheTranslationToTheComputer) {
@@ -76,17 +76,17 @@ TYPED_TEST(SettingTrace, LogsTheTranslationToTheComputer) {
     const std::string list = this->listOf(TypeParam::elementLabel, argument);
     agentEnvironment::forgetLog();
     this->setting.getComputerMoniker(argument);
-    EXPECT_THAT(this->told("getComputerMoniker"),
-                ElementsAre(Told{3000, entering("getComputerMoniker", TypeParam::sourceFile, list)},
-                            Told{4000, variable("Name", "beta", TypeParam::sourceFile)},
-                            Told{3000, exiting("getComputerMoniker", TypeParam::sourceFile, list)}));
+    EXPECT_THAT(this->loggedBy("getComputerMoniker"),
+                ElementsAre(LoggedRecord{3000, entering("getComputerMoniker", TypeParam::sourceFile, list)},
+                            LoggedRecord{4000, variable("Name", "beta", TypeParam::sourceFile)},
+                            LoggedRecord{3000, exiting("getComputerMoniker", TypeParam::sourceFile, list)}));
 }
 
 TYPED_TEST(SettingTrace, LogsTheElementsFilterWithTheIdentifier) {
     agentEnvironment::forgetLog();
     this->toElement({{"Name", "beta"}});
     const std::string list = " filterType=0 reference=/system/second%5Fbox";
-    EXPECT_THAT(textsOf(TypeParam::elementFile, "setFilter"),
+    EXPECT_THAT(logMessagesOf(TypeParam::elementFile, "setFilter"),
                 ElementsAre(entering("setFilter", TypeParam::elementFile, list),
                             exiting("setFilter", TypeParam::elementFile, list)));
 }
@@ -94,7 +94,7 @@ TYPED_TEST(SettingTrace, LogsTheElementsFilterWithTheIdentifier) {
 TYPED_TEST(SettingTrace, LogsTheFilterWithTheEmptyPathForAnUnknownComputer) {
     agentEnvironment::forgetLog();
     this->toElement({{"Name", "gamma"}});
-    EXPECT_EQ(textsOf(TypeParam::elementFile, "setFilter").at(0),
+    EXPECT_EQ(logMessagesOf(TypeParam::elementFile, "setFilter").at(0),
               entering("setFilter", TypeParam::elementFile, " filterType=0 reference="));
 }
 
@@ -103,14 +103,16 @@ TYPED_TEST(SettingTrace, LogsFailuresAtErrorLevelAndNoExit) {
     Moniker empty;
     EXPECT_THROW(TypeParam::elementMoniker(this->setting, empty), FrameworkException);
     EXPECT_THROW(this->setting.getComputerMoniker(empty), FrameworkException);
-    EXPECT_THAT(this->told(TypeParam::toElement),
-                ElementsAre(Told{3000, entering(TypeParam::toElement, TypeParam::sourceFile,
+    EXPECT_THAT(
+        this->loggedBy(TypeParam::toElement),
+        ElementsAre(LoggedRecord{3000, entering(TypeParam::toElement, TypeParam::sourceFile,
                                                 this->listOf(" monikerComputer=", empty))},
-                            Told{3000, message("Could not find 'Name' Key in Moniker", TypeParam::sourceFile)}));
-    EXPECT_THAT(this->told("getComputerMoniker"),
-                ElementsAre(Told{3000, entering("getComputerMoniker", TypeParam::sourceFile,
+                    LoggedRecord{3000, message("Could not find 'Name' Key in Moniker", TypeParam::sourceFile)}));
+    EXPECT_THAT(
+        this->loggedBy("getComputerMoniker"),
+        ElementsAre(LoggedRecord{3000, entering("getComputerMoniker", TypeParam::sourceFile,
                                                 this->listOf(TypeParam::elementLabel, empty))},
-                            Told{3000, message("Could not find 'InstanceID' Key in Moniker", TypeParam::sourceFile)}));
+                    LoggedRecord{3000, message("Could not find 'InstanceID' Key in Moniker", TypeParam::sourceFile)}));
 }
 
 }  // namespace

@@ -47,7 +47,7 @@ std::string thrown(Operation operation) {
 
 /** Returns whether a cursor has a current object. Its operator bool may move it, so test assertions cannot call it. */
 template <class Cursor>
-bool stands(Cursor& cursor) {
+bool hasCurrent(Cursor& cursor) {
     return cursor;
 }
 
@@ -58,7 +58,7 @@ inline std::string withoutLine(const std::string& text) {
 }
 
 /** Returns the messages of a channel's records in order, without line numbers. */
-inline std::vector<std::string> texts(const std::string& channel = "log") {
+inline std::vector<std::string> logMessages(const std::string& channel = "log") {
     std::vector<std::string> found;
     for (const LogRecord& record : agentEnvironment::log()) {
         if (record.channel == channel) {
@@ -81,7 +81,7 @@ inline std::vector<LogRecord> recordsOf(const std::string& file, const std::stri
 }
 
 /** Returns their messages without line numbers. */
-inline std::vector<std::string> textsOf(const std::string& file, const std::string& function) {
+inline std::vector<std::string> logMessagesOf(const std::string& file, const std::string& function) {
     std::vector<std::string> found;
     for (const LogRecord& record : recordsOf(file, function)) {
         found.push_back(withoutLine(record.text));

@@ -91,7 +91,7 @@ TEST(TraceFormat, CopiesPercentSignsLiterally) {
 }
 
 /** Returns a nonrepeating string, so that a shift is detected. */
-std::string longText(std::size_t length) {
+std::string longString(std::size_t length) {
     std::string text;
     while (text.size() < length) {
         text += std::to_string(text.size()) + "\xC3\xA9,";
@@ -100,7 +100,7 @@ std::string longText(std::size_t length) {
 }
 
 TEST(TraceFormat, TruncatesStringsAt511Characters) {
-    const std::string text = longText(2000);
+    const std::string text = longString(2000);
     const std::pair<std::string, const char*> cases[] = {
         {"ENTERING: " + text, trace(text.c_str(), "A.cpp", 1, KO::MT_ENTERING)},
         {"ENTERING: f() in A.cpp [Line: 1],Parameters List: " + text,
@@ -115,7 +115,7 @@ TEST(TraceFormat, TruncatesStringsAt511Characters) {
 
 TEST(TraceFormat, KeepsStringsOf511Characters) {
     const std::string head = "MESSAGE [File: A.cpp, Line: 1]: ";
-    const std::string text = longText(511 - head.size());
+    const std::string text = longString(511 - head.size());
     EXPECT_EQ(trace(text.c_str(), "A.cpp", 1, KO::MT_MESSAGE), head + text);
     EXPECT_EQ(trace((text + "x").c_str(), "A.cpp", 1, KO::MT_MESSAGE), head + text);
 }
@@ -124,14 +124,14 @@ TEST(TraceFormat, WritesOnlyToItsOwnBuffer) {
     const char* const list = tracepara("f", "A.cpp", 1, "list", KO::MT_EXITING);
     const char* const text = trace("v", "A.cpp", 1, "text");
     const char* const number = trace("v", "A.cpp", 1, 5U);
-    trace(longText(5000).c_str(), "A.cpp", 1, KO::MT_MESSAGE);
+    trace(longString(5000).c_str(), "A.cpp", 1, KO::MT_MESSAGE);
     EXPECT_STREQ(list, "EXITING: f() in A.cpp [Line: 1],Parameters List: list");
     EXPECT_STREQ(text, "VARIABLE: 'v' has Value 'text' at line 1 in A.cpp");
     EXPECT_STREQ(number, "VARIABLE: 'v' has Value '5' at line 1 in A.cpp");
 }
 
 TEST(TraceFormat, ClearsTheBufferBeforeEachString) {
-    trace(longText(600).c_str(), "A.cpp", 1, KO::MT_MESSAGE);
+    trace(longString(600).c_str(), "A.cpp", 1, KO::MT_MESSAGE);
     const char* const buffer = trace("f", "A.cpp", 1, KO::MT_METHOD);
     const char* const end = buffer + std::string(buffer).size();
     EXPECT_TRUE(std::all_of(end, buffer + 512, [](char byte) { return byte == '\0'; }));

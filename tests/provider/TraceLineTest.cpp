@@ -50,12 +50,12 @@ TEST_F(TraceLine, HasTheFunctionAndLineOfTheCall) {
 
 TEST_F(TraceLine, EscapesControlCharacters) {
     traceVariable(at(traceSource), "value", std::string("one\ntwo\tthree"));
-    EXPECT_THAT(texts(), ElementsAre(variable("value", "one\\ntwo\\tthree", "TraceLineTest.cpp")));
+    EXPECT_THAT(logMessages(), ElementsAre(variable("value", "one\\ntwo\\tthree", "TraceLineTest.cpp")));
 }
 
 TEST_F(TraceLine, FormatsAFlagAsANumber) {
     traceVariable(at(traceSource), "flag", true);
-    EXPECT_THAT(texts(), ElementsAre(variable("flag", "1", "TraceLineTest.cpp")));
+    EXPECT_THAT(logMessages(), ElementsAre(variable("flag", "1", "TraceLineTest.cpp")));
 }
 
 TEST_F(TraceLine, IsDroppedIfItsLevelIsNotAdmitted) {
@@ -66,7 +66,7 @@ TEST_F(TraceLine, IsDroppedIfItsLevelIsNotAdmitted) {
 TEST_F(TraceLine, IsTruncatedAt511Characters) {
     const std::string longList(600, 'x');
     traceLine({&traceSource, Level::flow, "f", 1}, MT_ENTERING, label::value, longList);
-    const auto shown = texts();
+    const auto shown = logMessages();
     ASSERT_EQ(shown.size(), 1U);
     const std::string head = "ENTERING: f() in TraceLineTest.cpp [Line: 1],Parameters List:  value=";
     const auto records = agentEnvironment::log();
@@ -79,8 +79,8 @@ enum class Colour : int { green = 6 };
 TEST_F(TraceLine, FormatsParameterListsAsLabelsAndValues) {
     traceLine(at(traceSource), MT_MESSAGE, label::property, Colour::green, label::value, std::string("a b"),
               label::instanceId, "text", label::filterTypeBare, 4294967295U);
-    EXPECT_THAT(texts(), ElementsAre("MESSAGE [File: TraceLineTest.cpp, Line: N]: TestBody,Parameters List:  "
-                                     "property=6 value=a b instanceId=textFilterType=4294967295"));
+    EXPECT_THAT(logMessages(), ElementsAre("MESSAGE [File: TraceLineTest.cpp, Line: N]: TestBody,Parameters List:  "
+                                           "property=6 value=a b instanceId=textFilterType=4294967295"));
 }
 
 TEST_F(TraceLine, FormatsAPointerAsAnAddress) {
@@ -89,7 +89,7 @@ TEST_F(TraceLine, FormatsAPointerAsAnAddress) {
     traceLine(at(traceSource), MT_ENTERING, label::broker, &target, label::context, nothing);
     std::ostringstream address;
     address << &target;
-    EXPECT_THAT(texts(),
+    EXPECT_THAT(logMessages(),
                 ElementsAre(entering("TestBody", "TraceLineTest.cpp", " _broker=" + address.str() + " _context=0")));
 }
 
@@ -100,10 +100,10 @@ void leaveNormally() {
 
 TEST_F(TraceLine, IsWrittenAtEntryAndExitOfAFunction) {
     leaveNormally();
-    EXPECT_THAT(texts(), ElementsAre(entering("leaveNormally", "TraceLineTest.cpp"),
-                                     "METHOD: leaveNormally() was invoked in TraceLineTest.cpp [Line: N]",
-                                     exiting("leaveNormally", "TraceLineTest.cpp")));
-    EXPECT_EQ(texts("trace"), texts("log"));
+    EXPECT_THAT(logMessages(), ElementsAre(entering("leaveNormally", "TraceLineTest.cpp"),
+                                           "METHOD: leaveNormally() was invoked in TraceLineTest.cpp [Line: N]",
+                                           exiting("leaveNormally", "TraceLineTest.cpp")));
+    EXPECT_EQ(logMessages("trace"), logMessages("log"));
 }
 
 void change(std::string& value) {
@@ -114,8 +114,8 @@ void change(std::string& value) {
 TEST_F(TraceLine, HasTheCurrentParametersAtTheExit) {
     std::string value = "before";
     change(value);
-    EXPECT_THAT(texts(), ElementsAre(entering("change", "TraceLineTest.cpp", " value=before"),
-                                     exiting("change", "TraceLineTest.cpp", " value=after")));
+    EXPECT_THAT(logMessages(), ElementsAre(entering("change", "TraceLineTest.cpp", " value=before"),
+                                           exiting("change", "TraceLineTest.cpp", " value=after")));
     EXPECT_EQ(agentEnvironment::log().back().level, 3000);
 }
 
@@ -125,8 +125,8 @@ void nameAsGiven() {
 
 TEST_F(TraceLine, HasTemporaryParametersAtTheExit) {
     nameAsGiven();
-    EXPECT_THAT(texts(), ElementsAre(entering("~Name", "TraceLineTest.cpp", " value=kept until the exit"),
-                                     exiting("~Name", "TraceLineTest.cpp", " value=kept until the exit")));
+    EXPECT_THAT(logMessages(), ElementsAre(entering("~Name", "TraceLineTest.cpp", " value=kept until the exit"),
+                                           exiting("~Name", "TraceLineTest.cpp", " value=kept until the exit")));
 }
 
 void leaveByException() {
@@ -136,8 +136,8 @@ void leaveByException() {
 
 TEST_F(TraceLine, IsNotWrittenAtTheExitByAnException) {
     EXPECT_EQ(thrown<FrameworkException>(leaveByException), "It failed.");
-    EXPECT_THAT(texts(), ElementsAre(entering("leaveByException", "TraceLineTest.cpp"),
-                                     message("It failed.", "TraceLineTest.cpp")));
+    EXPECT_THAT(logMessages(), ElementsAre(entering("leaveByException", "TraceLineTest.cpp"),
+                                           message("It failed.", "TraceLineTest.cpp")));
 }
 
 void swallow() {
@@ -151,7 +151,7 @@ void swallow() {
 
 TEST_F(TraceLine, IsWrittenAtTheExitAfterACaughtException) {
     swallow();
-    EXPECT_THAT(texts(),
+    EXPECT_THAT(logMessages(),
                 ElementsAre(entering("swallow", "TraceLineTest.cpp"), exiting("swallow", "TraceLineTest.cpp")));
 }
 
@@ -165,7 +165,7 @@ TEST_F(TraceLine, IsWrittenAtTheExitDuringUnwinding) {
         throw ProviderException("on its way");
     } catch (const ProviderException&) {
     }
-    EXPECT_THAT(texts(), testing::Contains(exiting("leaveNormally", "TraceLineTest.cpp")));
+    EXPECT_THAT(logMessages(), testing::Contains(exiting("leaveNormally", "TraceLineTest.cpp")));
 }
 
 TEST_F(TraceLine, IsWrittenAtErrorLevelBeforeAFailureIsThrown) {

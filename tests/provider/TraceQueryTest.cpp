@@ -17,11 +17,11 @@ const std::string loggerOfTest("Test.Logger");
 const TraceSource traceSource{loggerOfTest, "Unit.cpp"};
 
 /** A value that counts how often it is formatted. */
-struct Shown {
+struct FormattedValue {
     int& times;
 };
 
-std::ostream& operator<<(std::ostream& stream, const Shown& shown) {
+std::ostream& operator<<(std::ostream& stream, const FormattedValue& shown) {
     ++shown.times;
     return stream << "value";
 }
@@ -30,12 +30,12 @@ class TraceQuery : public testing::Test {
 protected:
     void SetUp() override {
         logDouble::records.clear();
-        logDouble::buffersMade = 0;
+        logDouble::buffersCreated = 0;
     }
 
     void traceEverything() {
         const CallSite site{&traceSource, Level::flow, "work", 7};
-        const Traced traced(site, label::value, Shown{timesShown});
+        const Traced traced(site, label::value, FormattedValue{timesFormatted});
         traceMethod(site);
         traceVariable(site, "name", std::string("text"));
         traceVariable(site, "number", 5U);
@@ -43,22 +43,22 @@ protected:
         markProviderExit(loggerOfTest, "work", "Unit.cpp", 2);
     }
 
-    int timesShown = 0;
+    int timesFormatted = 0;
 };
 
 TEST_F(TraceQuery, DoesNotFormatUnwantedLines) {
     logDouble::admittedLevel = Level::flow - 1;
     traceEverything();
     EXPECT_THAT(logDouble::records, IsEmpty());
-    EXPECT_EQ(timesShown, 0);
-    EXPECT_EQ(logDouble::buffersMade, 0);
+    EXPECT_EQ(timesFormatted, 0);
+    EXPECT_EQ(logDouble::buffersCreated, 0);
 }
 
 TEST_F(TraceQuery, WritesEveryAdmittedLine) {
     logDouble::admittedLevel = Level::flow;
     traceEverything();
     EXPECT_EQ(logDouble::records.size(), 18U);
-    EXPECT_EQ(timesShown, 2);
+    EXPECT_EQ(timesFormatted, 2);
 }
 
 TEST_F(TraceQuery, QueriesTheLevelOfEachLine) {

@@ -24,7 +24,7 @@ TEST_F(VendorlessAsset, PassesEveryVendorFilter) {
     for (const char* vendor : {"Computer Maker", "anybody", ""}) {
         AssetIDDetails element;
         element.setFilter(AssetIDDetails::FILTER_VENDOR, vendor);
-        EXPECT_TRUE(stands(element)) << vendor;
+        EXPECT_TRUE(hasCurrent(element)) << vendor;
         EXPECT_TRUE(element.evaluate());
     }
 }
@@ -33,7 +33,7 @@ TEST_F(VendorlessAsset, FailsOtherFilters) {
     AssetIDDetails element;
     element.setFilter(AssetIDDetails::FILTER_VENDOR, "anybody");
     element.setFilter(AssetIDDetails::FILTER_NAME, "otherhost");
-    EXPECT_FALSE(stands(element));
+    EXPECT_FALSE(hasCurrent(element));
 }
 
 TEST_F(VendorlessAsset, HasNoVendorAndKeepsTheArgument) {

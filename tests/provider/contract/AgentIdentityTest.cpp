@@ -220,11 +220,11 @@ TEST_F(AgentIdentityTest, TheAgentCannotBeCreatedModifiedOrDeleted) {
 }
 
 TEST_F(AgentIdentityTest, ObjectsThatCannotBeCreatedAreSkipped) {
-    for (const char* maker : {"CMPIBrokerEncFT.newObjectPath", "CMPIBrokerEncFT.newInstance"}) {
-        broker.failCall(maker, 1, CMPI_RC_ERR_FAILED);
+    for (const char* function : {"CMPIBrokerEncFT.newObjectPath", "CMPIBrokerEncFT.newInstance"}) {
+        broker.failCall(function, 1, CMPI_RC_ERR_FAILED);
         const Outcome outcome = provider().enumerateInstances(classPath(className));
-        EXPECT_THAT(outcome, isOk(1)) << maker;
-        EXPECT_THAT(outcome.instances(), IsEmpty()) << maker;
+        EXPECT_THAT(outcome, isOk(1)) << function;
+        EXPECT_THAT(outcome.instances(), IsEmpty()) << function;
     }
     broker.answerNothing("CMPIBrokerEncFT.newObjectPath", 1);
     const Outcome names = provider().enumerateInstanceNames(classPath(className));

@@ -124,13 +124,13 @@ const std::vector<ClassRow>& classes() {
 /** Returns names and types of some rows as a string. */
 template <class Accepts>
 std::vector<std::string> described(const std::vector<PropertyRow>& rows, Accepts accepts) {
-    std::vector<std::string> texts;
+    std::vector<std::string> strings;
     for (const PropertyRow& row : rows) {
         if (accepts(row)) {
-            texts.push_back(std::string(row.name) + " " + std::to_string(row.type));
+            strings.push_back(std::string(row.name) + " " + std::to_string(row.type));
         }
     }
-    return texts;
+    return strings;
 }
 
 cimhost::Schema readSchema() {
@@ -172,13 +172,13 @@ std::string comparable(const NamedValue& property) {
 }
 
 std::vector<std::string> comparable(const std::vector<Instance>& instances) {
-    std::vector<std::string> texts;
+    std::vector<std::string> strings;
     for (const Instance& instance : instances) {
-        texts.push_back(testsupport::toText(instance.path));
-        std::transform(instance.properties.begin(), instance.properties.end(), std::back_inserter(texts),
+        strings.push_back(testsupport::toText(instance.path));
+        std::transform(instance.properties.begin(), instance.properties.end(), std::back_inserter(strings),
                        [](const NamedValue& property) { return comparable(property); });
     }
-    return texts;
+    return strings;
 }
 
 /** A provider with two leases, two warranties, one computer system and complete asset data. */
@@ -260,9 +260,9 @@ TEST_P(AllClassesTest, NamesAndInstancesAreTheSameSet) {
     for (const Instance& instance : instances()) {
         ofInstances.push_back(instance.path);
     }
-    const auto texts = textsOf(names());
-    EXPECT_EQ(textsOf(ofInstances), texts);
-    EXPECT_EQ(std::set<std::string>(texts.begin(), texts.end()).size(), texts.size()) << "a name twice";
+    const auto strings = stringsOf(names());
+    EXPECT_EQ(stringsOf(ofInstances), strings);
+    EXPECT_EQ(std::set<std::string>(strings.begin(), strings.end()).size(), strings.size()) << "duplicate name";
 }
 
 TEST_P(AllClassesTest, PathsHaveTheClassAndItsKeys) {
@@ -302,9 +302,9 @@ TEST_P(AllClassesTest, GetReturnsEachEnumeratedNameExceptAssociations) {
 
 TEST_P(AllClassesTest, RepeatedEnumerationsAreEqual) {
     const auto first = comparable(instances());
-    const auto firstNames = textsOf(names());
+    const auto firstNames = stringsOf(names());
     EXPECT_EQ(comparable(instances()), first);
-    EXPECT_EQ(textsOf(names()), firstNames);
+    EXPECT_EQ(stringsOf(names()), firstNames);
     EXPECT_THAT(loggedFailures(), IsEmpty());
 }
 

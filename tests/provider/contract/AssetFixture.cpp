@@ -27,7 +27,7 @@ Instance AssetTest::asset() {
     return instances.size() == 1 ? instances[0] : Instance{};
 }
 
-std::vector<std::string> AssetTest::assetTexts() {
+std::vector<std::string> AssetTest::assetProperties() {
     std::vector<NamedValue> properties = asset().properties;
     properties.erase(std::remove_if(properties.begin(), properties.end(),
                                     [](const NamedValue& each) { return each.name == "LocalDateTime"; }),

@@ -22,7 +22,7 @@ protected:
     Instance asset();
 
     /** Returns its properties as "Name=value", except LocalDateTime. */
-    std::vector<std::string> assetTexts();
+    std::vector<std::string> assetProperties();
 
     /** Returns one of its properties as a string: "NULL" for null, "(none)" if it does not exist. */
     std::string property(const std::string& name);

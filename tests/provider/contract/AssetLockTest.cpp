@@ -18,10 +18,10 @@ using testsupport::text;
 class Interruption {
 public:
     Interruption(const CMPIBroker& original, std::function<void()> itsBody)
-        : body(std::move(itsBody)), brokerHandle(original), makers(*original.eft), originalMakers(original.eft) {
-        makers.newObjectPath = &newObjectPath;
-        makers.newInstance = &newInstance;
-        brokerHandle.eft = &makers;
+        : body(std::move(itsBody)), brokerHandle(original), factories(*original.eft), originalFactories(original.eft) {
+        factories.newObjectPath = &newObjectPath;
+        factories.newInstance = &newInstance;
+        brokerHandle.eft = &factories;
         active = this;
     }
     ~Interruption() { active = nullptr; }
@@ -58,11 +58,11 @@ private:
     static CMPIObjectPath* newObjectPath(const CMPIBroker* broker, const char* nameSpaceName, const char* className,
                                          CMPIStatus* rc) {
         active->interrupt();
-        return active->originalMakers->newObjectPath(broker, nameSpaceName, className, rc);
+        return active->originalFactories->newObjectPath(broker, nameSpaceName, className, rc);
     }
     static CMPIInstance* newInstance(const CMPIBroker* broker, const CMPIObjectPath* path, CMPIStatus* rc) {
         active->interrupt();
-        return active->originalMakers->newInstance(broker, path, rc);
+        return active->originalFactories->newInstance(broker, path, rc);
     }
     static CMPIStatus returnInstance(const CMPIResult*, const CMPIInstance* instance) {
         active->interrupt();
@@ -81,8 +81,8 @@ private:
     std::function<void()> body;
     bool isRunning = false;
     CMPIBroker brokerHandle;
-    CMPIBrokerEncFT makers;
-    const CMPIBrokerEncFT* originalMakers;
+    CMPIBrokerEncFT factories;
+    const CMPIBrokerEncFT* originalFactories;
     const CMPIResult* originalResult = nullptr;
     CMPIResultFT resultTable{};
     CMPIResult resultHandle{};

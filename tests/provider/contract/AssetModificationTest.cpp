@@ -76,14 +76,14 @@ TEST_F(AssetModificationTest, ItIsVisibleToTheNextRequestAndTheNextProcess) {
                                           named("ZOPMProfile", text("silver")),
                                           named("ZOPMUpdateTime", dateTime("20260708091011.000000+000"))};
     modify(changes);
-    const auto after = assetTexts();
+    const auto after = assetProperties();
     for (const std::string& change : shown(changes)) {
         EXPECT_THAT(after, Contains(change));
     }
     EXPECT_THAT(after, Contains("DeploymentProfile=\"silver\""));
     EXPECT_THAT(after, Contains("DeploymentUpdateTime=\"20260708091011.000000+000\""));
     unload();
-    EXPECT_EQ(assetTexts(), after);
+    EXPECT_EQ(assetProperties(), after);
 }
 
 TEST_F(AssetModificationTest, AnyStringIsReadBackUnchanged) {
@@ -116,7 +116,7 @@ TEST_F(AssetModificationTest, TheTagIsReadOnly) {
 
 TEST_F(AssetModificationTest, ReadOnlyPropertiesAreIgnored) {
     writeData(assetFile, "USER.ZOPMProfile=gold\nUSER.ZOPMUpdateTime=20250607080910.000000-120\n");
-    const auto before = assetTexts();
+    const auto before = assetProperties();
     modify({named("DeploymentProfile", text("silver")),
             named("DeploymentUpdateTime", dateTime("20260708091011.000000+000")), named("Name", text("other")),
             named("CSName", text("other")), named("Vendor", text("other")), named("Version", text("other")),
@@ -124,7 +124,7 @@ TEST_F(AssetModificationTest, ReadOnlyPropertiesAreIgnored) {
             named("Description", text("other")), named("ProductName", text("other")),
             named("AssetIDStringArea", testsupport::uint32(1)),
             named("LocalDateTime", dateTime("20260708091011.000000+000")), named("NoSuchProperty", text("other"))});
-    EXPECT_EQ(assetTexts(), before);
+    EXPECT_EQ(assetProperties(), before);
 }
 
 TEST_F(AssetModificationTest, UnknownKeysStayInTheFile) {
@@ -143,7 +143,7 @@ TEST_F(AssetModificationTest, AllFivePairsAreStored) {
     modify(pairs);
     EXPECT_THAT(storedPairs(), ElementsAre("L1|D1", "L2|D2", "L3|D3", "L4|D4", "L5|D5"));
     for (const std::string& pair : shown(pairs)) {
-        EXPECT_THAT(assetTexts(), Contains(pair));
+        EXPECT_THAT(assetProperties(), Contains(pair));
     }
 }
 

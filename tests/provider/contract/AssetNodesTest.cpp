@@ -30,7 +30,7 @@ std::string computer(const std::string& properties) {
 class AssetNodesTest : public AssetTest {
 protected:
     /** Sets the agent's instrumentation tree. */
-    void haveNodes(const std::string& toml) {
+    void setNodes(const std::string& toml) {
         unload();
         nodes.reset();
         nodes = std::make_unique<AgentNodes>(toml);
@@ -38,7 +38,7 @@ protected:
 
     /** Returns the property ProductName of a computer with this product. */
     std::string productNameOf(const std::string& product) {
-        haveNodes(system() + computer("\"108\" = \"testhost\", \"39\" = \"" + product + "\""));
+        setNodes(system() + computer("\"108\" = \"testhost\", \"39\" = \"" + product + "\""));
         return property("ProductName");
     }
 
@@ -77,25 +77,25 @@ TEST_F(AssetNodesTest, AProductNameWithoutADashIsTheComputersNameIfTheFileCannot
 }
 
 TEST_F(AssetNodesTest, AComputerWithoutAProductHasNoProductName) {
-    haveNodes(system() + computer("\"108\" = \"testhost\""));
+    setNodes(system() + computer("\"108\" = \"testhost\""));
     EXPECT_EQ(property("ProductName"), "(none)");
     EXPECT_EQ(asset().properties.size(), 32U);
 }
 
 TEST_F(AssetNodesTest, AComputerWithoutAProductHasTheOtherPropertiesIfTheFileCannotBeRead) {
     blockData(assetFile);
-    haveNodes(system() + computer("\"108\" = \"testhost\""));
+    setNodes(system() + computer("\"108\" = \"testhost\""));
     EXPECT_THAT(testsupport::namesOf(asset().properties),
                 ElementsAre("IdentifyingNumber", "Name", "Vendor", "Version", "Caption", "Description", "CSName",
                             "AssetIDStringArea", "LocalDateTime"));
-    EXPECT_THAT(assetTexts(),
+    EXPECT_THAT(assetProperties(),
                 ElementsAre("IdentifyingNumber=\"/system\"", "Name=\"testhost\"", "Vendor=\"Example Maker\"",
                             "Version=\"4.2.0\"", "Caption=\"Asset ID Information\"",
                             "Description=\"Asset ID Information\"", "CSName=\"testhost\"", "AssetIDStringArea=1024"));
 }
 
 TEST_F(AssetNodesTest, AComputerWithoutANameRepeatsThePrecedingStrings) {
-    haveNodes(system() + computer("\"39\" = \"Model X - Tower\""));
+    setNodes(system() + computer("\"39\" = \"Model X - Tower\""));
     const Instance instance = asset();
     EXPECT_EQ(shownProperty(instance, "Name"), "\"/system\"") << "the identifying number";
     EXPECT_EQ(shownProperty(instance, "CSName"), "\"Asset ID Information\"") << "the description";
@@ -104,19 +104,19 @@ TEST_F(AssetNodesTest, AComputerWithoutANameRepeatsThePrecedingStrings) {
 }
 
 TEST_F(AssetNodesTest, ASystemWithoutAVendorRepeatsThePrecedingString) {
-    haveNodes(system("\"108\" = \"testhost\"") + computer("\"36\" = \"not asked\", \"108\" = \"alpha\""));
+    setNodes(system("\"108\" = \"testhost\"") + computer("\"36\" = \"not asked\", \"108\" = \"alpha\""));
     EXPECT_EQ(property("Vendor"), "\"alpha\"") << "the name";
 }
 
 TEST_F(AssetNodesTest, WithoutNameAndVendorBothRepeatThePrecedingString) {
-    haveNodes(system("\"108\" = \"testhost\"") + computer("\"39\" = \"Model X - Tower\""));
+    setNodes(system("\"108\" = \"testhost\"") + computer("\"39\" = \"Model X - Tower\""));
     const Instance instance = asset();
     EXPECT_EQ(shownProperty(instance, "Name"), "\"/system\"");
     EXPECT_EQ(shownProperty(instance, "Vendor"), "\"/system\"");
 }
 
 TEST_F(AssetNodesTest, AKeyWhosePropertyCannotBeReadMatchesAnyValue) {
-    haveNodes(system("\"108\" = \"testhost\"") + computer("\"39\" = \"Model X - Tower\""));
+    setNodes(system("\"108\" = \"testhost\"") + computer("\"39\" = \"Model X - Tower\""));
     EXPECT_EQ(countWith({named("Vendor", text("whoever"))}), 1);
     EXPECT_EQ(countWith({named("Name", text("whatever"))}), 1);
     EXPECT_EQ(countWith({named("Vendor", text("whoever")), named("Version", text("other"))}), 0);
@@ -125,14 +125,14 @@ TEST_F(AssetNodesTest, AKeyWhosePropertyCannotBeReadMatchesAnyValue) {
 
 TEST_F(AssetNodesTest, WithoutASystemTheFileIsNotRead) {
     writeData(assetFile, "USER.AssetNumber=A-1\n");
-    haveNodes(computer("\"108\" = \"testhost\", \"39\" = \"Model X - Tower\""));
+    setNodes(computer("\"108\" = \"testhost\", \"39\" = \"Model X - Tower\""));
     const Instance instance = asset();
     EXPECT_THAT(testsupport::namesOf(instance.properties),
                 ElementsAre("IdentifyingNumber", "Name", "Vendor", "Version", "Caption", "Description", "CSName",
                             "AssetIDStringArea", "ProductName", "LocalDateTime"));
     EXPECT_EQ(shownProperty(instance, "IdentifyingNumber"), "\"\"");
     EXPECT_EQ(shownProperty(instance, "Name"), "\"testhost\"");
-    EXPECT_EQ(shownProperty(instance, "Vendor"), "\"testhost\"") << "the text before";
+    EXPECT_EQ(shownProperty(instance, "Vendor"), "\"testhost\"") << "the preceding string";
     EXPECT_EQ(readData(assetFile), "USER.AssetNumber=A-1\n");
 }
 
@@ -140,7 +140,7 @@ TEST_F(AssetNodesTest, AModificationWithoutReadingOverwritesTheFile) {
     writeData(assetFile,
               "USER.AssetNumber=A-1\nUSER.AssetIdTag=T-9\nUSER.Name=Ann\nUSER.PersonalizedLabel1=L1\n"
               "USER.PurchaseDate=20240101000000.000000+000\nOTHER.Key=kept\n");
-    haveNodes(computer("\"108\" = \"testhost\""));
+    setNodes(computer("\"108\" = \"testhost\""));
     const Outcome outcome =
         provider().modifyInstance(path(), clientInstance(path(), {named("SystemLocation", text("Hall"))}));
     EXPECT_THAT(outcome, isOk(0));
@@ -153,19 +153,19 @@ TEST_F(AssetNodesTest, AModificationWithoutReadingOverwritesTheFile) {
 }
 
 TEST_F(AssetNodesTest, WithoutAComputerThereIsNoInstance) {
-    haveNodes(system());
+    setNodes(system());
     for (const Outcome& outcome : {provider().enumerateInstances(path()), provider().enumerateInstanceNames(path()),
                                    provider().getInstance(path(keys()))}) {
         EXPECT_THAT(outcome, isOk(1));
         EXPECT_EQ(outcome.events.size(), 1U);
     }
-    EXPECT_EQ(readData(assetFile), "") << "the file is created all the same";
+    EXPECT_EQ(readData(assetFile), "") << "the file is created";
 }
 
 TEST_F(AssetNodesTest, EachComputerIsAnInstanceWithTheSameAssetData) {
     writeData(assetFile, "USER.AssetNumber=A-1\n");
-    haveNodes(system() + computer("\"108\" = \"alpha\", \"39\" = \"Model X - Tower\"") +
-              node(40, "/system/second", "\"108\" = \"beta\", \"39\" = \"Model Y - Rack\""));
+    setNodes(system() + computer("\"108\" = \"alpha\", \"39\" = \"Model X - Tower\"") +
+             node(40, "/system/second", "\"108\" = \"beta\", \"39\" = \"Model Y - Rack\""));
     const Outcome outcome = provider().enumerateInstances(path());
     EXPECT_THAT(outcome, isOk(1));
     const auto instances = outcome.instances();
@@ -184,8 +184,8 @@ TEST_F(AssetNodesTest, EachComputerIsAnInstanceWithTheSameAssetData) {
 }
 
 TEST_F(AssetNodesTest, KeysSelectAmongSeveralComputers) {
-    haveNodes(system() + computer("\"108\" = \"alpha\"") + node(40, "/system/second", "\"108\" = \"beta\"") +
-              node(40, "/system/third", "\"108\" = \"alpha\""));
+    setNodes(system() + computer("\"108\" = \"alpha\"") + node(40, "/system/second", "\"108\" = \"beta\"") +
+             node(40, "/system/third", "\"108\" = \"alpha\""));
     const auto found = provider().getInstance(path({named("Name", text("beta"))})).instances();
     ASSERT_EQ(found.size(), 1U);
     EXPECT_EQ(textOf(found[0].properties, "Name"), "beta");
@@ -195,7 +195,7 @@ TEST_F(AssetNodesTest, KeysSelectAmongSeveralComputers) {
 }
 
 TEST_F(AssetNodesTest, TheIdentifyingNumberIsThePathOfTheSystemNode) {
-    haveNodes(node(1, "/my system_1", "\"36\" = \"Example Maker\"") + computer("\"108\" = \"testhost\""));
+    setNodes(node(1, "/my system_1", "\"36\" = \"Example Maker\"") + computer("\"108\" = \"testhost\""));
     EXPECT_EQ(property("IdentifyingNumber"), "\"/my%20system%5F1\"");
     EXPECT_EQ(countWith({named("IdentifyingNumber", text("/my%20system%5F1"))}), 1);
     EXPECT_EQ(countWith({named("IdentifyingNumber", text("/my system_1"))}), 0);

@@ -29,7 +29,7 @@ constexpr const char* fullFile =
 TEST_F(AssetReadingTest, EveryValueOfTheFileIsReturnedInOrder) {
     writeData(assetFile, fullFile);
     EXPECT_THAT(
-        assetTexts(),
+        assetProperties(),
         ElementsAre("IdentifyingNumber=\"/system\"", "Name=\"testhost\"", "Vendor=\"Example Maker\"",
                     "Version=\"4.2.0\"", "Caption=\"Asset ID Information\"", "Description=\"Asset ID Information\"",
                     "CSName=\"testhost\"", "PrimaryOwnerName=\"Ann Owner\"", "PrimaryOwnerPhone=\"+49 30 1\"",
@@ -41,7 +41,7 @@ TEST_F(AssetReadingTest, EveryValueOfTheFileIsReturnedInOrder) {
                     "LastInventoried=\"20250102030405.000000+060\"", "PurchaseDate=\"20240101000000.000000+000\"",
                     "SystemLocation=\"Room 5\"", "ZOPMProfile=\"gold\"", "ZOPMUpdateTime=\"20250607080910.000000-120\"",
                     "DeploymentProfile=\"gold\"", "DeploymentUpdateTime=\"20250607080910.000000-120\""));
-    EXPECT_EQ(readData(assetFile), fullFile) << "reading leaves the file alone";
+    EXPECT_EQ(readData(assetFile), fullFile) << "reading does not change the file";
 }
 
 TEST_F(AssetReadingTest, ThePathHasFourKeys) {
@@ -114,7 +114,7 @@ TEST_F(AssetReadingTest, LocalDateTimeIsATimeWithOffset) {
     ASSERT_TRUE(now.has_value());
     EXPECT_EQ(now->size(), 25U);
     EXPECT_THAT(now->at(21), testing::AnyOf('+', '-'));
-    EXPECT_GT(*now, "2020") << "the present time, not the beginning of all time";
+    EXPECT_GT(*now, "2020") << "the current time, not 1970";
 }
 
 TEST_F(AssetReadingTest, ThePropertyListIsNotApplied) {
@@ -210,11 +210,11 @@ TEST_F(AssetReadingTest, AFileThatBecomesReadableIsRead) {
 }
 
 TEST_F(AssetReadingTest, ObjectsThatCannotBeCreatedAreSkipped) {
-    for (const char* maker : {"CMPIBrokerEncFT.newObjectPath", "CMPIBrokerEncFT.newInstance"}) {
-        broker.failCall(maker, 1, CMPI_RC_ERR_FAILED);
+    for (const char* function : {"CMPIBrokerEncFT.newObjectPath", "CMPIBrokerEncFT.newInstance"}) {
+        broker.failCall(function, 1, CMPI_RC_ERR_FAILED);
         const Outcome outcome = provider().enumerateInstances(path());
-        EXPECT_THAT(outcome, isOk(1)) << maker;
-        EXPECT_THAT(outcome.instances(), IsEmpty()) << maker;
+        EXPECT_THAT(outcome, isOk(1)) << function;
+        EXPECT_THAT(outcome.instances(), IsEmpty()) << function;
     }
     broker.failCall("CMPIBrokerEncFT.newObjectPath", 1, CMPI_RC_ERR_FAILED);
     EXPECT_THAT(provider().enumerateInstanceNames(path()).paths(), IsEmpty());
@@ -225,7 +225,7 @@ TEST_F(AssetReadingTest, AssetsCannotBeCreatedOrDeleted) {
     const Instance instance = clientInstance(path(keys()), {named("AssetNumber", text("1"))});
     EXPECT_THAT(provider().createInstance(path(keys()), instance), isRefused(CMPI_RC_ERR_INVALID_CLASS));
     EXPECT_THAT(provider().deleteInstance(path(keys())), isRefused(CMPI_RC_ERR_INVALID_CLASS));
-    EXPECT_EQ(readData(assetFile), std::nullopt) << "a refused request does not touch the file";
+    EXPECT_EQ(readData(assetFile), std::nullopt) << "a rejected request does not access the file";
 }
 
 }  // namespace

@@ -44,25 +44,25 @@ Instance computerSystem(const std::string& name) {
                                   testsupport::named("Caption", testsupport::nullOf(CMPI_string))});
 }
 
-std::vector<std::string> textsOf(const std::vector<ObjectPath>& paths) {
-    std::vector<std::string> texts;
-    std::transform(paths.begin(), paths.end(), std::back_inserter(texts), testsupport::toText);
-    return texts;
+std::vector<std::string> stringsOf(const std::vector<ObjectPath>& paths) {
+    std::vector<std::string> strings;
+    std::transform(paths.begin(), paths.end(), std::back_inserter(strings), testsupport::toText);
+    return strings;
 }
 
-std::vector<std::string> textsOf(const std::vector<Instance>& instances) {
-    std::vector<std::string> texts;
-    std::transform(instances.begin(), instances.end(), std::back_inserter(texts), [](const Instance& instance) {
+std::vector<std::string> stringsOf(const std::vector<Instance>& instances) {
+    std::vector<std::string> strings;
+    std::transform(instances.begin(), instances.end(), std::back_inserter(strings), [](const Instance& instance) {
         return testsupport::toText(instance.path) + " " + cimhost::formatMof(instance);
     });
-    return texts;
+    return strings;
 }
 
-void AssociationTest::haveRecords(const std::vector<std::string>& identifiers) {
+void AssociationTest::writeRecordFile(const std::vector<std::string>& identifiers) {
     writeData(kind().dataFile, recordFile(kind(), identifiers));
 }
 
-void AssociationTest::knowComputers(const std::vector<std::string>& names) {
+void AssociationTest::setComputers(const std::vector<std::string>& names) {
     std::vector<Instance> computers;
     std::transform(names.begin(), names.end(), std::back_inserter(computers), computerSystem);
     broker.serve("VELKO_ComputerSystem", std::move(computers));

@@ -53,8 +53,8 @@ constexpr const char* ofGamma = "/system/third";
 Instance computerSystem(const std::string& name);
 
 /** Return paths, or complete instances, as strings. */
-std::vector<std::string> textsOf(const std::vector<ObjectPath>& paths);
-std::vector<std::string> textsOf(const std::vector<Instance>& instances);
+std::vector<std::string> stringsOf(const std::vector<ObjectPath>& paths);
+std::vector<std::string> stringsOf(const std::vector<Instance>& instances);
 
 /** An agent with three computers, and an object manager with the computer systems that the test sets. */
 class AssociationTest : public ProviderTest, public testing::WithParamInterface<AssociationKind> {
@@ -64,10 +64,10 @@ protected:
     static const AssociationKind& kind() { return GetParam(); }
 
     /** Writes records for the provider to load. */
-    static void haveRecords(const std::vector<std::string>& identifiers);
+    static void writeRecordFile(const std::vector<std::string>& identifiers);
 
     /** Sets the computer systems of the object manager, in order. */
-    void knowComputers(const std::vector<std::string>& names);
+    void setComputers(const std::vector<std::string>& names);
 
     /** @name Operations with the association class of the test */
     ///@{

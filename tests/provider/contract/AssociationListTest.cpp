@@ -15,17 +15,17 @@ class AssociationListTest : public AssociationTest {};
 INSTANTIATE_TEST_SUITE_P(Kinds, AssociationListTest, testing::Values(leases, warranties), associationName);
 
 TEST_P(AssociationListTest, OneComputerIsPairedWithEachRecord) {
-    haveRecords({"A", "B", "C"});
-    knowComputers({"alpha"});
+    writeRecordFile({"A", "B", "C"});
+    setComputers({"alpha"});
     const Outcome outcome = names();
     EXPECT_THAT(outcome, isOk(1));
-    EXPECT_THAT(textsOf(outcome.paths()), ElementsAre(pair("alpha", "A"), pair("alpha", "B"), pair("alpha", "C")));
-    EXPECT_EQ(outcome.events.size(), 4U) << "three paths and the end";
+    EXPECT_THAT(stringsOf(outcome.paths()), ElementsAre(pair("alpha", "A"), pair("alpha", "B"), pair("alpha", "C")));
+    EXPECT_EQ(outcome.events.size(), 4U) << "three paths and done";
 }
 
 TEST_P(AssociationListTest, PathsHaveBothEndsAsKeys) {
-    haveRecords({"A"});
-    knowComputers({"alpha"});
+    writeRecordFile({"A"});
+    setComputers({"alpha"});
     const ObjectPath path = names().paths().at(0);
     EXPECT_EQ(path.className, kind().association);
     EXPECT_EQ(path.nameSpace, nameSpace);
@@ -35,8 +35,8 @@ TEST_P(AssociationListTest, PathsHaveBothEndsAsKeys) {
 }
 
 TEST_P(AssociationListTest, InstancesHaveOnlyTheKeyProperties) {
-    haveRecords({"A", "B"});
-    knowComputers({"alpha"});
+    writeRecordFile({"A", "B"});
+    setComputers({"alpha"});
     const auto paths = names().paths();
     const Outcome outcome = instances();
     EXPECT_THAT(outcome, isOk(1));
@@ -49,7 +49,7 @@ TEST_P(AssociationListTest, InstancesHaveOnlyTheKeyProperties) {
 }
 
 TEST_P(AssociationListTest, NoRecordAndOneComputerYieldNoPair) {
-    knowComputers({"alpha"});
+    setComputers({"alpha"});
     const Outcome outcome = names();
     EXPECT_THAT(outcome, isOk(1));
     EXPECT_THAT(outcome.paths(), IsEmpty());
@@ -57,8 +57,8 @@ TEST_P(AssociationListTest, NoRecordAndOneComputerYieldNoPair) {
 }
 
 TEST_P(AssociationListTest, NoRecordAndTwoComputersYieldOnePairWithoutAnElementKey) {
-    knowComputers({"alpha", "beta"});
-    EXPECT_THAT(textsOf(names().paths()), ElementsAre(pairWithoutElement("alpha")));
+    setComputers({"alpha", "beta"});
+    EXPECT_THAT(stringsOf(names().paths()), ElementsAre(pairWithoutElement("alpha")));
     const Outcome outcome = instances();
     EXPECT_THAT(outcome, isOk(1));
     ASSERT_EQ(outcome.instances().size(), 1U);
@@ -68,47 +68,47 @@ TEST_P(AssociationListTest, NoRecordAndTwoComputersYieldOnePairWithoutAnElementK
 }
 
 TEST_P(AssociationListTest, OfTwoComputersTheFirstIsPairedWithAllRecords) {
-    haveRecords({"A", "B"});
-    knowComputers({"alpha", "beta"});
-    EXPECT_THAT(textsOf(names().paths()), ElementsAre(pair("alpha", "A"), pair("alpha", "B")));
+    writeRecordFile({"A", "B"});
+    setComputers({"alpha", "beta"});
+    EXPECT_THAT(stringsOf(names().paths()), ElementsAre(pair("alpha", "A"), pair("alpha", "B")));
 }
 
 TEST_P(AssociationListTest, AComputerBetweenTheFirstAndTheLastIsPairedWithNoRecord) {
-    haveRecords({"A", "B"});
-    knowComputers({"alpha", "beta", "gamma"});
-    EXPECT_THAT(textsOf(names().paths()),
+    writeRecordFile({"A", "B"});
+    setComputers({"alpha", "beta", "gamma"});
+    EXPECT_THAT(stringsOf(names().paths()),
                 ElementsAre(pair("alpha", "A"), pair("alpha", "B"), pairWithoutElement("beta")));
 }
 
 TEST_P(AssociationListTest, NoRecordAndThreeComputersYieldTwoPairsWithoutAnElementKey) {
-    knowComputers({"alpha", "beta", "gamma"});
-    EXPECT_THAT(textsOf(names().paths()), ElementsAre(pairWithoutElement("alpha"), pairWithoutElement("beta")));
+    setComputers({"alpha", "beta", "gamma"});
+    EXPECT_THAT(stringsOf(names().paths()), ElementsAre(pairWithoutElement("alpha"), pairWithoutElement("beta")));
 }
 
 TEST_P(AssociationListTest, ComputersNeedNotBeKnownToTheAgent) {
-    haveRecords({"A"});
-    knowComputers({"unheard of"});
-    EXPECT_THAT(textsOf(names().paths()), ElementsAre(pair("unheard of", "A")));
+    writeRecordFile({"A"});
+    setComputers({"unheard of"});
+    EXPECT_THAT(stringsOf(names().paths()), ElementsAre(pair("unheard of", "A")));
 }
 
 TEST_P(AssociationListTest, DeletedRecordsAreInNoPair) {
-    haveRecords({"A", "B", "C"});
-    knowComputers({"alpha"});
+    writeRecordFile({"A", "B", "C"});
+    setComputers({"alpha"});
     ASSERT_THAT(provider().deleteInstance(keyedPath(kind().element, "B")), isOk(0));
-    EXPECT_THAT(textsOf(names().paths()), ElementsAre(pair("alpha", "A"), pair("alpha", "C")));
+    EXPECT_THAT(stringsOf(names().paths()), ElementsAre(pair("alpha", "A"), pair("alpha", "C")));
 }
 
 TEST_P(AssociationListTest, RecordsOfTheOtherClassAreInNoPair) {
     const AssociationKind& other = std::string(kind().element) == leases.element ? warranties : leases;
     writeData(other.dataFile, recordFile(other, {"X"}));
-    haveRecords({"A"});
-    knowComputers({"alpha"});
-    EXPECT_THAT(textsOf(names().paths()), ElementsAre(pair("alpha", "A")));
+    writeRecordFile({"A"});
+    setComputers({"alpha"});
+    EXPECT_THAT(stringsOf(names().paths()), ElementsAre(pair("alpha", "A")));
 }
 
 TEST_P(AssociationListTest, ComputersAreEnumeratedInTheRequestsNamespace) {
-    haveRecords({"A"});
-    knowComputers({"alpha"});
+    writeRecordFile({"A"});
+    setComputers({"alpha"});
     const Outcome outcome =
         provider().enumerateInstanceNames(testsupport::objectPath("root/other", kind().association));
     const auto calls = broker.calls("CMPIBrokerFT.enumerateInstances");
@@ -122,36 +122,36 @@ TEST_P(AssociationListTest, ComputersAreEnumeratedInTheRequestsNamespace) {
 }
 
 TEST_P(AssociationListTest, KeysOfTheRequestsPathAreIgnored) {
-    haveRecords({"A", "B"});
-    knowComputers({"alpha"});
+    writeRecordFile({"A", "B"});
+    setComputers({"alpha"});
     const ObjectPath keyed = association(computerPath("alpha"), keyedPath(kind().element, "B"));
-    EXPECT_THAT(textsOf(provider().enumerateInstanceNames(keyed).paths()),
+    EXPECT_THAT(stringsOf(provider().enumerateInstanceNames(keyed).paths()),
                 ElementsAre(pair("alpha", "A"), pair("alpha", "B")));
 }
 
 TEST_P(AssociationListTest, ThePropertyListIsNotApplied) {
-    haveRecords({"A"});
-    knowComputers({"alpha"});
-    const auto all = textsOf(instances().instances());
+    writeRecordFile({"A"});
+    setComputers({"alpha"});
+    const auto all = stringsOf(instances().instances());
     const Outcome narrowed =
         provider().enumerateInstances(classPath(kind().association), std::vector<std::string>{"Dependent"});
-    EXPECT_EQ(textsOf(narrowed.instances()), all);
+    EXPECT_EQ(stringsOf(narrowed.instances()), all);
 }
 
 TEST_P(AssociationListTest, TheClassNameIsCaseInsensitive) {
-    haveRecords({"A"});
-    knowComputers({"alpha"});
+    writeRecordFile({"A"});
+    setComputers({"alpha"});
     std::string lowered = kind().association;
     for (char& character : lowered) {
         character = static_cast<char>(std::tolower(static_cast<unsigned char>(character)));
     }
-    EXPECT_THAT(textsOf(provider().enumerateInstanceNames(classPath(lowered)).paths()),
+    EXPECT_THAT(stringsOf(provider().enumerateInstanceNames(classPath(lowered)).paths()),
                 ElementsAre(pair("alpha", "A")));
 }
 
 TEST_P(AssociationListTest, EnumerationChangesNothing) {
-    haveRecords({"A"});
-    knowComputers({"alpha"});
+    writeRecordFile({"A"});
+    setComputers({"alpha"});
     const auto before = readData(kind().dataFile);
     names();
     instances();
@@ -159,22 +159,22 @@ TEST_P(AssociationListTest, EnumerationChangesNothing) {
 }
 
 TEST_P(AssociationListTest, GetInstanceIsNotSupported) {
-    haveRecords({"A"});
-    knowComputers({"alpha"});
+    writeRecordFile({"A"});
+    setComputers({"alpha"});
     const ObjectPath existing = names().paths().at(0);
     EXPECT_THAT(provider().getInstance(existing), isRefused(CMPI_RC_ERR_NOT_SUPPORTED));
-    EXPECT_EQ(upCalls(), 1) << "the enumeration's alone";
+    EXPECT_EQ(upCalls(), 1) << "only that of the enumeration";
 }
 
 TEST_P(AssociationListTest, AssociationsCannotBeCreatedModifiedOrDeleted) {
-    haveRecords({"A"});
-    knowComputers({"alpha"});
+    writeRecordFile({"A"});
+    setComputers({"alpha"});
     const ObjectPath path = names().paths().at(0);
     const Instance instance = clientInstance(path, path.keys);
     EXPECT_THAT(provider().createInstance(path, instance), isRefused(CMPI_RC_ERR_INVALID_CLASS));
     EXPECT_THAT(provider().modifyInstance(path, instance), isRefused(CMPI_RC_ERR_INVALID_CLASS));
     EXPECT_THAT(provider().deleteInstance(path), isRefused(CMPI_RC_ERR_INVALID_CLASS));
-    EXPECT_THAT(textsOf(names().paths()), ElementsAre(pair("alpha", "A")));
+    EXPECT_THAT(stringsOf(names().paths()), ElementsAre(pair("alpha", "A")));
 }
 
 }  // namespace

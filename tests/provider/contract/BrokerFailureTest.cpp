@@ -23,7 +23,7 @@ constexpr CMPIrc brokerCode = CMPI_RC_ERR_ACCESS_DENIED;
 class BrokerFailureTest : public RecordTest {
 protected:
     /** Lets a call fail, or return null with the status OK. */
-    void spoil(const std::string& function, int number, bool isSilent) {
+    void failOneCall(const std::string& function, int number, bool isSilent) {
         if (isSilent) {
             broker.answerNothing(function, number);
         } else {
@@ -35,7 +35,7 @@ protected:
 TEST_P(BrokerFailureTest, APathThatCannotBeCreatedIsOmitted) {
     createAll({"A", "B", "C"});
     for (const bool isSilent : {false, true}) {
-        spoil(newObjectPath, 2, isSilent);
+        failOneCall(newObjectPath, 2, isSilent);
         const Outcome outcome = provider().enumerateInstanceNames(allPath());
         EXPECT_THAT(outcome, isOk(1));
         EXPECT_THAT(identifiersOf(outcome.paths()), ElementsAre("A", "C"));
@@ -51,19 +51,19 @@ TEST_P(BrokerFailureTest, NothingIsReturnedIfNoPathCanBeCreated) {
     EXPECT_THAT(provider().enumerateInstances(allPath()), isOk(1));
     EXPECT_EQ(broker.count("CMPIResultFT.returnObjectPath"), 0);
     EXPECT_EQ(broker.count("CMPIResultFT.returnInstance"), 0);
-    EXPECT_EQ(broker.count(newInstance), 0) << "no instance is made without a path";
+    EXPECT_EQ(broker.count(newInstance), 0) << "no instance is created without a path";
     EXPECT_EQ(broker.count(newObjectPath), 6) << "each record is tried";
 }
 
 TEST_P(BrokerFailureTest, AnInstanceThatCannotBeCreatedIsOmitted) {
     createAll({"A", "B", "C"});
-    for (const char* maker : {newInstance, newObjectPath}) {
+    for (const char* function : {newInstance, newObjectPath}) {
         for (const bool isSilent : {false, true}) {
-            spoil(maker, 1, isSilent);
+            failOneCall(function, 1, isSilent);
             const Outcome all = provider().enumerateInstances(allPath());
             EXPECT_THAT(all, isOk(1));
             EXPECT_THAT(identifiersOf(all.instances()), ElementsAre("B", "C"));
-            spoil(maker, 1, isSilent);
+            failOneCall(function, 1, isSilent);
             const Outcome one = get("B");
             EXPECT_THAT(one, isOk(1));
             EXPECT_THAT(one.instances(), IsEmpty());
@@ -73,9 +73,9 @@ TEST_P(BrokerFailureTest, AnInstanceThatCannotBeCreatedIsOmitted) {
 }
 
 TEST_P(BrokerFailureTest, ARecordIsCreatedEvenIfItsInstanceCannotBeCreated) {
-    for (const char* maker : {newInstance, newObjectPath}) {
-        spoil(maker, 1, false);
-        const Outcome outcome = create(maker);
+    for (const char* function : {newInstance, newObjectPath}) {
+        failOneCall(function, 1, false);
+        const Outcome outcome = create(function);
         EXPECT_THAT(outcome, isOk(1));
         EXPECT_THAT(outcome.events, SizeIs(1));
     }
@@ -109,7 +109,7 @@ TEST_P(BrokerFailureTest, ADateThatTheBrokerCannotCreateIsNull) {
     createAll({"A"});
     modify("A", {named(kind().dateProperty, text("20240506070809.123456+120"))});
     for (const bool isSilent : {false, true}) {
-        spoil("CMPIBrokerEncFT.newDateTimeFromChars", 1, isSilent);
+        failOneCall("CMPIBrokerEncFT.newDateTimeFromChars", 1, isSilent);
         EXPECT_EQ(recordOf("A"), kind().shownRecord("A"));
     }
 }
@@ -155,11 +155,11 @@ protected:
 
     /**
      * @param expected code of the request for the failing call
-     * @param mostDone maximum number of calls of returnDone
+     * @param maximumDone maximum number of calls of returnDone
      * @param after called after each request, to check and restore the state
      */
     void failInTurn(const Request& request, const ExpectedCode& expected, const std::function<void()>& after,
-                    int mostDone = 1) {
+                    int maximumDone = 1) {
         broker.forget();
         EXPECT_EQ(request().rc, CMPI_RC_OK);
         const std::vector<std::string> functions = broker.functions();
@@ -177,18 +177,18 @@ protected:
                     broker.failCall(function, number, brokerCode);
                 }
                 agentEnvironment::forgetLog();
-                expectHarmless(request(), expected(index, isSilent), mostDone);
+                expectHarmless(request(), expected(index, isSilent), maximumDone);
                 broker.obey();
                 after();
             }
         }
     }
 
-    static void expectHarmless(const Outcome& outcome, CMPIrc code, int mostDone) {
+    static void expectHarmless(const Outcome& outcome, CMPIrc code, int maximumDone) {
         EXPECT_EQ(outcome.rc, code);
         EXPECT_FALSE(outcome.hasMessage);
         EXPECT_FALSE(outcome.threw);
-        EXPECT_LE(outcome.doneCount, mostDone);
+        EXPECT_LE(outcome.doneCount, maximumDone);
     }
 
     /** For operations that take the class from the path: the first two calls read it. */

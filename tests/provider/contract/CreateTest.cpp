@@ -40,7 +40,7 @@ protected:
     }
 
     /** Expects that nothing was created and that the request succeeded without an instance. */
-    void expectNothingMade(const Outcome& outcome) {
+    void expectNothingCreated(const Outcome& outcome) {
         EXPECT_THAT(outcome, isOk(1));
         EXPECT_THAT(outcome.events, SizeIs(1));
         EXPECT_THAT(identifiers(), IsEmpty());
@@ -49,7 +49,7 @@ protected:
     }
 
     /** Expects that the record "A" was created with an empty namespace, since the namespace could not be read. */
-    void expectMadeWithoutNamespace(const Outcome& outcome, CMPIrc rc) {
+    void expectCreatedWithoutNamespace(const Outcome& outcome, CMPIrc rc) {
         EXPECT_EQ(outcome.rc, rc);
         EXPECT_FALSE(outcome.hasMessage);
         EXPECT_EQ(outcome.doneCount, 1);
@@ -134,40 +134,40 @@ TEST_P(CreateTest, AnIdentifierThatDiffersInCaseIsNoDuplicate) {
 }
 
 TEST_P(CreateTest, APathWithoutKeysCreatesNothing) {
-    expectNothingMade(provider().createInstance(allPath(), clientInstance(allPath(), {})));
+    expectNothingCreated(provider().createInstance(allPath(), clientInstance(allPath(), {})));
 }
 
 TEST_P(CreateTest, APathWithAnotherKeyCreatesNothing) {
-    expectNothingMade(createByKeys({named("Name", text("A"))}));
+    expectNothingCreated(createByKeys({named("Name", text("A"))}));
 }
 
 TEST_P(CreateTest, AKeyOfAnotherTypeCreatesNothing) {
     for (const cimhost::Value& key :
          {uint32(1), testsupport::boolean(true), testsupport::uint64(1), testsupport::reference(path("A")),
           testsupport::dateTime("20240506070809.000000+000")}) {
-        expectNothingMade(createByKeys({named("InstanceID", key)}));
+        expectNothingCreated(createByKeys({named("InstanceID", key)}));
     }
 }
 
 TEST_P(CreateTest, ANullStringAsKeyCreatesNothing) {
-    expectNothingMade(createByData(stringData(nullptr)));
+    expectNothingCreated(createByData(stringData(nullptr)));
 }
 
 TEST_P(CreateTest, AKeyStringWithoutCharactersCreatesNothing) {
-    expectNothingMade(createByData(stringData(broker.stringWithoutCharacters())));
+    expectNothingCreated(createByData(stringData(broker.stringWithoutCharacters())));
 }
 
 TEST_P(CreateTest, AKeyInTheNullStateCreatesNothing) {
     for (CMPIString* string : {broker.string("A"), broker.stringWithoutCharacters()}) {
         CMPIData data = stringData(string);
         data.state = CMPI_nullValue;
-        expectNothingMade(createByData(data));
+        expectNothingCreated(createByData(data));
     }
 }
 
 TEST_P(CreateTest, AKeyThatCannotBeReadCreatesNothing) {
-    expectNothingMade(createByData(stringData(nullptr), CMPI_RC_ERR_FAILED));
-    expectNothingMade(createByData(stringData(broker.string("A")), CMPI_RC_ERR_NOT_FOUND));
+    expectNothingCreated(createByData(stringData(nullptr), CMPI_RC_ERR_FAILED));
+    expectNothingCreated(createByData(stringData(broker.string("A")), CMPI_RC_ERR_NOT_FOUND));
 }
 
 TEST_P(CreateTest, AnEmptyIdentifierCreatesARecord) {
@@ -188,7 +188,7 @@ TEST_P(CreateTest, AFailureToReadTheNamespaceIsReturnedAndTheRecordIsCreated) {
     broker.failEvery(getNameSpace, CMPI_RC_ERR_INVALID_NAMESPACE);
     const Outcome outcome = create("A");
     broker.obey();
-    expectMadeWithoutNamespace(outcome, CMPI_RC_ERR_INVALID_NAMESPACE);
+    expectCreatedWithoutNamespace(outcome, CMPI_RC_ERR_INVALID_NAMESPACE);
 }
 
 TEST_P(CreateTest, AFailureToReadTheNamespaceCharactersIsReturnedAndTheRecordIsCreated) {
@@ -196,7 +196,7 @@ TEST_P(CreateTest, AFailureToReadTheNamespaceCharactersIsReturnedAndTheRecordIsC
     broker.failCall(getCharPtr, call, CMPI_RC_ERR_FAILED);
     const Outcome outcome = create("A");
     broker.obey();
-    expectMadeWithoutNamespace(outcome, CMPI_RC_ERR_FAILED);
+    expectCreatedWithoutNamespace(outcome, CMPI_RC_ERR_FAILED);
 }
 
 TEST_P(CreateTest, NullNamespaceCharactersMeanTheEmptyNamespace) {
@@ -204,14 +204,14 @@ TEST_P(CreateTest, NullNamespaceCharactersMeanTheEmptyNamespace) {
     broker.answerNothing(getCharPtr, call);
     const Outcome outcome = create("A");
     broker.obey();
-    expectMadeWithoutNamespace(outcome, CMPI_RC_OK);
+    expectCreatedWithoutNamespace(outcome, CMPI_RC_OK);
 }
 
 TEST_P(CreateTest, ANullNamespaceStringMeansTheEmptyNamespace) {
     broker.answerNothingEver(getNameSpace);
     const Outcome outcome = create("A");
     broker.obey();
-    expectMadeWithoutNamespace(outcome, CMPI_RC_OK);
+    expectCreatedWithoutNamespace(outcome, CMPI_RC_OK);
 }
 
 TEST_P(CreateTest, TheNamespaceFailureIsReturnedIfNothingIsCreated) {

@@ -25,11 +25,11 @@ protected:
 TEST_P(DataDirectoryTest, CreationWithoutADirectoryReturnsTheInstanceAndKeepsItInMemory) {
     std::filesystem::remove_all(agentEnvironment::dataDirectory());
     const Outcome outcome = create("A");
-    EXPECT_THAT(outcome, isOk(1)) << "the end was sent before the file was written";
+    EXPECT_THAT(outcome, isOk(1)) << "returnDone is called before the file is written";
     EXPECT_THAT(identifiersOf(outcome.instances()), ElementsAre("A"));
     expectRewriteFailure();
     EXPECT_THAT(identifiers(), ElementsAre("A"));
-    EXPECT_FALSE(std::filesystem::exists(agentEnvironment::dataDirectory())) << "the provider makes no directory";
+    EXPECT_FALSE(std::filesystem::exists(agentEnvironment::dataDirectory())) << "the provider creates no directory";
 }
 
 TEST_P(DataDirectoryTest, ChangesToAFileThatCannotBeOpenedStayInMemory) {

@@ -19,13 +19,13 @@ using testing::SizeIs;
 using testsupport::named;
 using testsupport::text;
 
-constexpr const char* thrownText = "the broker throws";
+constexpr const char* thrownMessage = "the broker throws";
 
 /** A string whose getCharPtr throws. Global, since functions of the tables have no other access to it. */
-CMPIString* throwingText = nullptr;
+CMPIString* throwingString = nullptr;
 
-CMPIString* giveThrowingText(const CMPIObjectPath*, CMPIStatus*) {
-    return throwingText;
+CMPIString* returnThrowingString(const CMPIObjectPath*, CMPIStatus*) {
+    return throwingString;
 }
 
 /** The part of a request's path that throws. */
@@ -36,9 +36,9 @@ struct ThrowingPart {
 
 constexpr ThrowingPart throwingParts[] = {
     {"class name", [](CMPIObjectPathFT& table) { throwFrom<std::runtime_error>(table.getClassName); }},
-    {"characters of the class name", [](CMPIObjectPathFT& table) { table.getClassName = &giveThrowingText; }},
+    {"characters of the class name", [](CMPIObjectPathFT& table) { table.getClassName = &returnThrowingString; }},
     {"namespace", [](CMPIObjectPathFT& table) { throwFrom<std::runtime_error>(table.getNameSpace); }},
-    {"characters of the namespace", [](CMPIObjectPathFT& table) { table.getNameSpace = &giveThrowingText; }},
+    {"characters of the namespace", [](CMPIObjectPathFT& table) { table.getNameSpace = &returnThrowingString; }},
 };
 
 class ExceptionTest : public RecordTest {
@@ -132,7 +132,7 @@ protected:
         return provider().call([&](auto& scope, const CMPIContext* context, const CMPIResult* result) {
             Altered<CMPIString> text(broker.string("root/cimv2"));
             throwFrom<std::runtime_error>(text.table.getCharPtr);
-            throwingText = text.handle();
+            throwingString = text.handle();
             Altered<CMPIObjectPath> altered(scope.objectPath(path("A")));
             part.alter(altered.table);
             return request.run(context, result, altered.handle());
@@ -156,7 +156,7 @@ TEST_P(ExceptionTest, AStandardExceptionEndsTheRequestSuccessfullyWithoutDone) {
     const Outcome outcome = enumerateInto(throwError);
     EXPECT_THAT(outcome, isOk(0));
     EXPECT_THAT(outcome.events, IsEmpty());
-    EXPECT_THAT(caughtFailures(), ElementsAre(thrownText));
+    EXPECT_THAT(caughtFailures(), ElementsAre(thrownMessage));
 }
 
 TEST_P(ExceptionTest, CaughtExceptionsAreLoggedAtErrorLevelOnBothChannels) {
@@ -170,7 +170,7 @@ TEST_P(ExceptionTest, CaughtExceptionsAreLoggedAtErrorLevelOnBothChannels) {
             if (record.level == 3000) {
                 ++found;
                 EXPECT_EQ(record.text, "MESSAGE [File: LeaseAndWarrantyProvider.cpp, Line: " +
-                                           std::to_string(record.line) + "]: " + thrownText);
+                                           std::to_string(record.line) + "]: " + thrownMessage);
                 EXPECT_EQ(record.file, "LeaseAndWarrantyProvider.cpp");
                 EXPECT_EQ(record.logger, "Tarvik.LeaseAndWarrantyProvider");
                 EXPECT_EQ(record.function, "LeaseAndWarranty_EnumInstances");
@@ -207,21 +207,21 @@ TEST_P(ExceptionTest, AnExceptionFromReturnDoneIsCaught) {
     const Outcome outcome = enumerateInto([](CMPIResultFT& table) { throwFrom<std::runtime_error>(table.returnDone); });
     EXPECT_THAT(outcome, isOk(0));
     EXPECT_THAT(outcome.instances(), SizeIs(1));
-    EXPECT_THAT(caughtFailures(), ElementsAre(thrownText));
+    EXPECT_THAT(caughtFailures(), ElementsAre(thrownMessage));
 }
 
 TEST_P(ExceptionTest, ExceptionsFromTheBrokersFactoryFunctionsAreCaught) {
     createAll({"A"});
     AlteredBroker altered(broker.handle());
-    throwFrom<std::runtime_error>(altered.makers.newInstance);
-    throwFrom<std::invalid_argument>(altered.makers.newObjectPath);
+    throwFrom<std::runtime_error>(altered.factories.newInstance);
+    throwFrom<std::invalid_argument>(altered.factories.newObjectPath);
     provider().createInstanceMI(altered.handle(), nullptr);
     EXPECT_THAT(provider().enumerateInstances(allPath()), isOk(0));
     EXPECT_THAT(provider().enumerateInstanceNames(allPath()), isOk(0));
     EXPECT_THAT(remove("A"), isOk(0));
     provider().createInstanceMI(broker.handle(), nullptr);
-    EXPECT_THAT(caughtFailures(), ElementsAre(thrownText, thrownText, thrownText));
-    EXPECT_THAT(identifiers(), ElementsAre("A")) << "the deletion looks at the record before it removes it";
+    EXPECT_THAT(caughtFailures(), ElementsAre(thrownMessage, thrownMessage, thrownMessage));
+    EXPECT_THAT(identifiers(), ElementsAre("A")) << "the deletion reads the record before it removes it";
 }
 
 TEST_P(ExceptionTest, ExceptionsFromTheRequestsPathAreCaught) {
@@ -234,7 +234,7 @@ TEST_P(ExceptionTest, ExceptionsFromTheRequestsPathAreCaught) {
     });
     EXPECT_THAT(outcome, isOk(0));
     EXPECT_THAT(outcome.events, IsEmpty());
-    EXPECT_THAT(caughtFailures(), ElementsAre(thrownText));
+    EXPECT_THAT(caughtFailures(), ElementsAre(thrownMessage));
 }
 
 TEST_P(ExceptionTest, ExceptionsFromClassNameAndNamespaceAreCaughtInEveryRequest) {
@@ -246,7 +246,7 @@ TEST_P(ExceptionTest, ExceptionsFromClassNameAndNamespaceAreCaughtInEveryRequest
             const Outcome outcome = callWithThrowing(part, request);
             EXPECT_THAT(outcome, isOk(0));
             EXPECT_THAT(outcome.events, IsEmpty());
-            EXPECT_THAT(caughtFailures(), ElementsAre(thrownText));
+            EXPECT_THAT(caughtFailures(), ElementsAre(thrownMessage));
             EXPECT_EQ(logOf().back().function, "markProviderExit");
         }
     }
@@ -258,15 +258,15 @@ TEST_P(ExceptionTest, AStatusOfTheNamespaceBeforeAnExceptionIsReturned) {
     CMPIInstanceMI* interface = provider().instanceMI();
     const Outcome outcome = provider().call([&](auto& scope, const CMPIContext* context, const CMPIResult* result) {
         Altered<CMPIObjectPath> altered(scope.objectPath(path("A")));
-        throwingText = broker.string("a message");
+        throwingString = broker.string("a message");
         altered.table.getNameSpace = [](const CMPIObjectPath*, CMPIStatus* status) -> CMPIString* {
-            *status = {CMPI_RC_ERR_ACCESS_DENIED, throwingText};
-            throw std::runtime_error(thrownText);
+            *status = {CMPI_RC_ERR_ACCESS_DENIED, throwingString};
+            throw std::runtime_error(thrownMessage);
         };
         return interface->ft->createInstance(interface, context, result, altered.handle(), nullptr);
     });
     EXPECT_THAT(outcome, isRefused(CMPI_RC_ERR_ACCESS_DENIED));
-    EXPECT_THAT(caughtFailures(), ElementsAre(thrownText));
+    EXPECT_THAT(caughtFailures(), ElementsAre(thrownMessage));
     EXPECT_THAT(identifiers(), IsEmpty());
 }
 
@@ -311,7 +311,7 @@ TEST_P(ExceptionTest, AFailedRewriteDuringUnwindingIsLoggedAndTheFirstExceptionP
     const Outcome outcome = createInto("A", throwError);
     EXPECT_THAT(outcome, isOk(0));
     EXPECT_THAT(outcome.events, IsEmpty());
-    EXPECT_THAT(caughtFailures(), ElementsAre(thrownText));
+    EXPECT_THAT(caughtFailures(), ElementsAre(thrownMessage));
     EXPECT_THAT(loggedFailures(), Contains(kind().cannotOpen));
     EXPECT_THAT(loggedFailures("trace"), Contains(kind().cannotOpen));
     EXPECT_THAT(identifiers(), ElementsAre("A"));
@@ -322,7 +322,7 @@ TEST_P(ExceptionTest, ANonstandardExceptionLeavesTheEntryPoint) {
     EXPECT_THAT(loggedFailures(), IsEmpty());
     EXPECT_THAT(functionsLogged(), AllOf(Contains("markProviderEntry"), Not(Contains("markProviderExit"))));
     EXPECT_EQ(data(), dataOfNew({"A"})) << "written while the exception leaves";
-    EXPECT_THAT(identifiers(), ElementsAre("A")) << "the provider goes on";
+    EXPECT_THAT(identifiers(), ElementsAre("A")) << "the provider continues";
     createAll({"B"});
     EXPECT_THAT(identifiers(), ElementsAre("A", "B"));
 }

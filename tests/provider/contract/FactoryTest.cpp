@@ -93,26 +93,26 @@ protected:
     TwoBrokersTest() { writeData("Lease.dat", "1\nA\n*\n00000000000000.000000-000\n0\n0\n0\n0\n0\n*\n*\n*\n*\n0\n"); }
 
     /** Returns the number of object paths that each broker created for an enumeration of names. */
-    std::vector<int> pathsMade() {
+    std::vector<int> createdPaths() {
         broker.forget();
         other.forget();
         EXPECT_THAT(provider().enumerateInstanceNames(classPath("VELKO_Lease")).paths(), SizeIs(1));
-        return {broker.count(maker), other.count(maker)};
+        return {broker.count(newObjectPath), other.count(newObjectPath)};
     }
 
-    static constexpr const char* maker = "CMPIBrokerEncFT.newObjectPath";
+    static constexpr const char* newObjectPath = "CMPIBrokerEncFT.newObjectPath";
     testsupport::RecordingBroker other;
 };
 
 TEST_F(TwoBrokersTest, TheBrokerOfTheLaterFactoryCallServesAllRequests) {
     provider().createInstanceMI(broker.handle(), nullptr);
-    EXPECT_THAT(pathsMade(), ElementsAre(1, 0));
+    EXPECT_THAT(createdPaths(), ElementsAre(1, 0));
     provider().createAssociationMI(other.handle(), nullptr);
-    EXPECT_THAT(pathsMade(), ElementsAre(0, 1)) << "both interfaces use the one broker";
+    EXPECT_THAT(createdPaths(), ElementsAre(0, 1)) << "both interfaces use the same broker";
     provider().createInstanceMI(broker.handle(), nullptr);
-    EXPECT_THAT(pathsMade(), ElementsAre(1, 0));
+    EXPECT_THAT(createdPaths(), ElementsAre(1, 0));
     provider().createInstanceMI(other.handle(), nullptr);
-    EXPECT_THAT(pathsMade(), ElementsAre(0, 1));
+    EXPECT_THAT(createdPaths(), ElementsAre(0, 1));
 }
 
 TEST_F(TwoBrokersTest, AssociationRequestsUseTheBrokerOfTheLaterFactoryCallToo) {
@@ -121,14 +121,14 @@ TEST_F(TwoBrokersTest, AssociationRequestsUseTheBrokerOfTheLaterFactoryCallToo) 
     const cimhost::AssociationFilter filter{"VELKO_LeaseSetting", {}, {}, {}};
     EXPECT_THAT(provider().associatorNames(testsupport::objectPath(nameSpace, "VELKO_ComputerSystem"), filter).paths(),
                 SizeIs(1));
-    EXPECT_EQ(broker.count(maker), 0);
-    EXPECT_GT(other.count(maker), 0);
+    EXPECT_EQ(broker.count(newObjectPath), 0);
+    EXPECT_GT(other.count(newObjectPath), 0);
 }
 
 TEST_F(TwoBrokersTest, CleanupKeepsTheBroker) {
     provider().createInstanceMI(broker.handle(), nullptr);
     provider().cleanupInstanceMI(true);
-    EXPECT_THAT(pathsMade(), ElementsAre(1, 0));
+    EXPECT_THAT(createdPaths(), ElementsAre(1, 0));
 }
 
 TEST_F(FactoryTest, ANullBrokerIsAcceptedAndRequestsReturnNoObjects) {

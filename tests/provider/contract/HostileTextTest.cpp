@@ -19,7 +19,7 @@ using testsupport::RecordModel;
 using testsupport::text;
 
 /** Returns a string of all special characters, repeated up to a length. */
-std::string longText(std::size_t length) {
+std::string longString(std::size_t length) {
     std::string all;
     while (all.size() < length) {
         all += "some words_and\ttabs\nlines \xC3\xA4 * ";
@@ -27,8 +27,8 @@ std::string longText(std::size_t length) {
     return all.substr(0, length);
 }
 
-const std::vector<std::string>& hostileTexts() {
-    static const std::vector<std::string> texts{
+const std::vector<std::string>& hostileStrings() {
+    static const std::vector<std::string> strings{
         "",
         "*",
         "X",
@@ -66,8 +66,8 @@ const std::vector<std::string>& hostileTexts() {
         std::string(10000, 'x'),
         std::string(10000, ' '),
         std::string(10000, '\n'),
-        longText(10000)};
-    return texts;
+        longString(10000)};
+    return strings;
 }
 
 /** Returns all fields of a log record except its message. */
@@ -170,7 +170,7 @@ protected:
     }
 
     /** Restarts without records and log. */
-    void startAnew() {
+    void restartEmpty() {
         unload();
         agentEnvironment::clear();
         model.records.clear();
@@ -178,7 +178,7 @@ protected:
 
     /** Returns the log of creating, modifying and deleting a record with that identifier and value. */
     std::vector<std::string> logOfLife(const std::string& instanceId, const std::string& value) {
-        startAnew();
+        restartEmpty();
         create(instanceId);
         get(instanceId);
         modify(instanceId, {named(kind().textProperty, text(value))});
@@ -192,9 +192,9 @@ protected:
 };
 
 TEST_P(HostileTextTest, IdentifiersAreKeptInMemoryAndReloadedFromTheFile) {
-    for (const std::string& hostile : hostileTexts()) {
+    for (const std::string& hostile : hostileStrings()) {
         SCOPED_TRACE(testing::PrintToString(hostile.substr(0, 50)));
-        startAnew();
+        restartEmpty();
         createBoth("before");
         createBoth(hostile);
         createBoth("after");
@@ -205,9 +205,9 @@ TEST_P(HostileTextTest, IdentifiersAreKeptInMemoryAndReloadedFromTheFile) {
 }
 
 TEST_P(HostileTextTest, ValuesAreKeptInMemoryAndReloadedFromTheFile) {
-    for (const std::string& hostile : hostileTexts()) {
+    for (const std::string& hostile : hostileStrings()) {
         SCOPED_TRACE(testing::PrintToString(hostile.substr(0, 50)));
-        startAnew();
+        restartEmpty();
         createBoth("before");
         createBoth("hostile");
         createBoth("after");
@@ -219,11 +219,11 @@ TEST_P(HostileTextTest, ValuesAreKeptInMemoryAndReloadedFromTheFile) {
 }
 
 TEST_P(HostileTextTest, RecordsWithHostileIdentifiersCanBeFoundAndDeleted) {
-    for (const std::string& hostile : hostileTexts()) {
+    for (const std::string& hostile : hostileStrings()) {
         createBoth(hostile);
     }
     expectAgreement();
-    for (const std::string& hostile : hostileTexts()) {
+    for (const std::string& hostile : hostileStrings()) {
         SCOPED_TRACE(testing::PrintToString(hostile.substr(0, 50)));
         EXPECT_EQ(identifiersOf(get(hostile).instances()), std::vector<std::string>{hostile});
         removeBoth(hostile);
@@ -233,7 +233,7 @@ TEST_P(HostileTextTest, RecordsWithHostileIdentifiersCanBeFoundAndDeleted) {
 
 TEST_P(HostileTextTest, LogRecordsCannotBeForged) {
     const auto harmless = logOfLife("harmless", "harmless");
-    for (const std::string& hostile : hostileTexts()) {
+    for (const std::string& hostile : hostileStrings()) {
         SCOPED_TRACE(testing::PrintToString(hostile.substr(0, 50)));
         EXPECT_EQ(logOfLife(hostile, "harmless"), harmless);
         EXPECT_EQ(logOfLife("harmless", hostile), harmless);
@@ -241,8 +241,8 @@ TEST_P(HostileTextTest, LogRecordsCannotBeForged) {
 }
 
 TEST_P(HostileTextTest, ADuplicateIsLoggedAlikeForAnyIdentifier) {
-    for (const std::string& hostile : hostileTexts()) {
-        startAnew();
+    for (const std::string& hostile : hostileStrings()) {
+        restartEmpty();
         create(hostile);
         create(hostile);
         EXPECT_EQ(caughtFailures(), std::vector<std::string>{kind().exists});
@@ -252,10 +252,10 @@ TEST_P(HostileTextTest, ADuplicateIsLoggedAlikeForAnyIdentifier) {
 
 TEST_P(HostileTextTest, ClassNamesCannotForgeLogRecords) {
     provider();
-    for (const std::string& hostile : hostileTexts()) {
+    for (const std::string& hostile : hostileStrings()) {
         agentEnvironment::forgetLog();
         EXPECT_THAT(provider().getInstance(keyedPath(hostile, hostile)), isRefused(CMPI_RC_ERR_INVALID_CLASS));
-        EXPECT_EQ(shapeOfLog().size(), 10U) << "two rules, entry, class id and exit, on two channels";
+        EXPECT_EQ(shapeOfLog().size(), 10U) << "two separators, entry, class id and exit, on two channels";
         EXPECT_THAT(malformedLogLines(), IsEmpty());
     }
 }
@@ -275,11 +275,11 @@ TEST_P(HostileTextTest, AnySequenceOfRequestsAndRestartsMatchesTheModel) {
     const auto someIdentifier = [&] {
         return model.records.empty() || below(4) == 0 ? word() : model.records[below(model.records.size())].front();
     };
-    constexpr std::size_t mostRecords = 6;
+    constexpr std::size_t maximumRecords = 6;
     for (int step = 0; step < 80 && !HasFailure(); ++step) {
         SCOPED_TRACE(step);
         const std::size_t choice = below(20);
-        if (model.records.size() >= mostRecords || choice < 4) {
+        if (model.records.size() >= maximumRecords || choice < 4) {
             removeBoth(someIdentifier());
         } else if (choice < 11) {
             createBoth(word());

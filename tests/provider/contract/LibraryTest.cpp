@@ -138,9 +138,9 @@ TEST_P(LoadingTest, EachLoadReadsTheFileAndEachUnloadRemovesTheLibrary) {
 
 TEST_P(LoadingTest, UnloadingWritesNothing) {
     createAll({"A"});
-    writeData(kind().dataFile, "somebody else's");
+    writeData(kind().dataFile, "another user's");
     unload();
-    EXPECT_EQ(data(), "somebody else's");
+    EXPECT_EQ(data(), "another user's");
 }
 
 TEST_P(LoadingTest, TheFileIsReadWhenTheLibraryIsLoaded) {

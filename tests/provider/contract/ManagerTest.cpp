@@ -18,7 +18,7 @@ using testsupport::uint32;
 /** Makes each request once and expects the results that every broker must yield. */
 class ManagerTest : public RecordTest {
 protected:
-    void expectWholeLifeOfRecords() {
+    void expectAllRequestsServed() {
         broker.serve("VELKO_ComputerSystem", {clientInstance(computerPath(), {})});
         createAll({"A", "B"});
         EXPECT_THAT(modify("A", {named(kind().textProperty, text("some text")), named(kind().numberProperty, uint32(5)),
@@ -57,17 +57,17 @@ protected:
 TEST_P(ManagerTest, VersionZeroAndMissingFunctionsAreAccepted) {
     broker.poseAs(Manager::sfcb);
     ASSERT_EQ(broker.handle()->bft->brokerVersion, 0);
-    expectWholeLifeOfRecords();
+    expectAllRequestsServed();
 }
 
 TEST_P(ManagerTest, AMissingMemoryTableIsAccepted) {
     broker.poseAs(Manager::openPegasus);
     ASSERT_EQ(broker.handle()->mft, nullptr);
-    expectWholeLifeOfRecords();
+    expectAllRequestsServed();
 }
 
 TEST_P(ManagerTest, NoBrokerServicesExceptObjectCreationAreUsed) {
-    expectWholeLifeOfRecords();
+    expectAllRequestsServed();
     for (const std::string& function : broker.functions()) {
         EXPECT_NE(function.substr(0, function.find('.')), "CMPIBrokerMemFT") << function;
         EXPECT_NE(function.substr(0, function.find('.')), "CMPIBrokerExtFT") << function;

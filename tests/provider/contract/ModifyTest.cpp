@@ -106,16 +106,16 @@ TEST_P(ModifyTest, ValuesOfAnotherTypeChangeNothing) {
 
 TEST_P(ModifyTest, NumbersOfAnyIntegerTypeAreAcceptedIfTheyFit) {
     createAll({"A"});
-    const auto shownAs = [&](unsigned int number) { return kind().shownRecord("A", {shownNumber(number)}); };
+    const auto withNumber = [&](unsigned int number) { return kind().shownRecord("A", {shownNumber(number)}); };
     constexpr std::uint64_t largest = std::numeric_limits<std::uint32_t>::max();
-    EXPECT_EQ(after(kind().numberProperty, testsupport::uint8(8)), shownAs(8));
-    EXPECT_EQ(after(kind().numberProperty, testsupport::uint16(16)), shownAs(16));
-    EXPECT_EQ(after(kind().numberProperty, testsupport::uint64(64)), shownAs(64));
-    EXPECT_EQ(after(kind().numberProperty, sint32(32)), shownAs(32));
-    EXPECT_EQ(after(kind().numberProperty, testsupport::uint64(largest)), shownAs(4294967295U));
-    EXPECT_EQ(after(kind().numberProperty, uint32(0)), shownAs(0));
-    EXPECT_EQ(after(kind().numberProperty, testsupport::uint64(largest + 1)), shownAs(0));
-    EXPECT_EQ(after(kind().numberProperty, sint32(-1)), shownAs(0));
+    EXPECT_EQ(after(kind().numberProperty, testsupport::uint8(8)), withNumber(8));
+    EXPECT_EQ(after(kind().numberProperty, testsupport::uint16(16)), withNumber(16));
+    EXPECT_EQ(after(kind().numberProperty, testsupport::uint64(64)), withNumber(64));
+    EXPECT_EQ(after(kind().numberProperty, sint32(32)), withNumber(32));
+    EXPECT_EQ(after(kind().numberProperty, testsupport::uint64(largest)), withNumber(4294967295U));
+    EXPECT_EQ(after(kind().numberProperty, uint32(0)), withNumber(0));
+    EXPECT_EQ(after(kind().numberProperty, testsupport::uint64(largest + 1)), withNumber(0));
+    EXPECT_EQ(after(kind().numberProperty, sint32(-1)), withNumber(0));
 }
 
 TEST_P(ModifyTest, DatesAreAcceptedAsDatetimeAndAsString) {

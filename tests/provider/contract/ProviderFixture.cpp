@@ -36,14 +36,14 @@ std::optional<std::string> messageOf(const LogRecord& record) {
 
 template <class Accepts>
 std::vector<std::string> failures(const std::string& channel, Accepts accepts) {
-    std::vector<std::string> texts;
+    std::vector<std::string> strings;
     for (const LogRecord& record : logOf(channel)) {
         const auto text = messageOf(record);
         if (text && record.level == errorLevel && accepts(record)) {
-            texts.push_back(*text);
+            strings.push_back(*text);
         }
     }
-    return texts;
+    return strings;
 }
 
 }  // namespace
@@ -83,11 +83,11 @@ std::vector<std::string> identifiersOf(const std::vector<Instance>& instances) {
 }
 
 std::vector<std::string> shown(const std::vector<NamedValue>& values) {
-    std::vector<std::string> texts;
+    std::vector<std::string> strings;
     for (const NamedValue& each : values) {
-        texts.push_back(each.name + "=" + cimhost::formatMof(each.value));
+        strings.push_back(each.name + "=" + cimhost::formatMof(each.value));
     }
-    return texts;
+    return strings;
 }
 
 std::vector<LogRecord> logOf(const std::string& channel) {

@@ -35,7 +35,7 @@ TEST_P(RecordRequestTest, EnumerationReturnsRecordsInTheOrderOfCreation) {
     const Outcome outcome = provider().enumerateInstances(allPath());
     EXPECT_THAT(outcome, isOk(1));
     EXPECT_THAT(identifiersOf(outcome.instances()), ElementsAre("C", "A", "B"));
-    EXPECT_TRUE(std::holds_alternative<cimhost::Done>(outcome.events.back())) << "the end comes last";
+    EXPECT_TRUE(std::holds_alternative<cimhost::Done>(outcome.events.back())) << "done is last";
 }
 
 TEST_P(RecordRequestTest, PathsHaveTheClassTheRequestsNamespaceAndOneKey) {
@@ -186,7 +186,7 @@ TEST_P(RecordRequestTest, ADeletedRecordCanBeCreatedAgainAtTheEnd) {
     EXPECT_THAT(remove("A"), isOk(0));
     createAll({"A"});
     EXPECT_THAT(identifiers(), ElementsAre("B", "A"));
-    EXPECT_EQ(recordOf("A"), kind().shownRecord("A")) << "nothing of the deleted record remains";
+    EXPECT_EQ(recordOf("A"), kind().shownRecord("A")) << "the deleted record is removed completely";
     EXPECT_EQ(data(), dataOfNew({"B", "A"}));
 }
 
@@ -218,7 +218,7 @@ TEST_F(ProviderTest, LeasesAndWarrantiesShareNoData) {
     };
     EXPECT_EQ(create(lease).instances().size(), 1U);
     EXPECT_EQ(readData(warranty.dataFile), std::nullopt);
-    EXPECT_EQ(create(warranty).instances().size(), 1U) << "a lease's identifier is not taken among warranties";
+    EXPECT_EQ(create(warranty).instances().size(), 1U) << "a lease and a warranty may have the same identifier";
     EXPECT_THAT(provider().deleteInstance(keyedPath(lease.className, "same")), isOk(0));
     EXPECT_THAT(identifiersOf(provider().enumerateInstanceNames(classPath(warranty.className)).paths()),
                 ElementsAre("same"));

@@ -30,15 +30,15 @@ private:
 /** A copy of a broker with a separate table of creating functions. */
 class AlteredBroker {
 public:
-    explicit AlteredBroker(const CMPIBroker* original) : makers(*original->eft), broker(*original) {
-        broker.eft = &makers;
+    explicit AlteredBroker(const CMPIBroker* original) : factories(*original->eft), broker(*original) {
+        broker.eft = &factories;
     }
     AlteredBroker(const AlteredBroker&) = delete;
     AlteredBroker& operator=(const AlteredBroker&) = delete;
 
     const CMPIBroker* handle() const { return &broker; }
 
-    CMPIBrokerEncFT makers;
+    CMPIBrokerEncFT factories;
 
 private:
     CMPIBroker broker;

@@ -56,21 +56,21 @@ int expectedLevel(const LogRecord& record, const Line& line) {
 }
 
 TEST_F(TranscriptPropertyTest, LevelsMatchTheKindOfRecord) {
-    std::set<std::string> seenMessages;
-    std::set<std::string> seenRaised;
+    std::set<std::string> foundMessages;
+    std::set<std::string> foundRaised;
     forEachRecord([&](const LogRecord& record, const Line& line) {
         EXPECT_EQ(record.level, expectedLevel(record, line)) << record.file << " " << record.text;
         if (line.kind == Line::message) {
-            seenMessages.insert(line.value);
+            foundMessages.insert(line.value);
         } else if (record.level == 3000) {
-            seenRaised.insert(record.file + " " + record.function);
+            foundRaised.insert(record.file + " " + record.function);
         }
     });
     for (const std::string& message : flowMessages()) {
-        EXPECT_THAT(seenMessages, Contains(message)) << "no scenario shows it";
+        EXPECT_THAT(foundMessages, Contains(message)) << "no scenario contains it";
     }
-    EXPECT_THAT(seenMessages, Contains(loudMessage));
-    EXPECT_EQ(seenRaised.size(), 18U) << "not every function at the level of errors is in a scenario";
+    EXPECT_THAT(foundMessages, Contains(loudMessage));
+    EXPECT_EQ(foundRaised.size(), 18U) << "a function at error level is in no scenario";
 }
 
 TEST_F(TranscriptPropertyTest, TheDetailMessageIsWrittenOncePerOpen) {
@@ -90,7 +90,7 @@ TEST_F(TranscriptPropertyTest, TwoSourceFilesUseTheShorterLoggerName) {
         EXPECT_EQ(record.logger, isShort ? shortLogger : logger) << record.file;
         files.insert(record.file);
     });
-    EXPECT_EQ(files.size(), 17U) << "sixteen units and the markers";
+    EXPECT_EQ(files.size(), 17U) << "sixteen source files and the markers";
 }
 
 TEST_F(TranscriptPropertyTest, OnlyLeasesLogTheirCreation) {
@@ -117,7 +117,7 @@ std::string propertyListIn(const std::string& parameters) {
 }
 
 TEST_F(TranscriptPropertyTest, APropertyListIsLoggedWhereverItIsPassed) {
-    const auto toldBy = [&](const std::string& scenario) {
+    const auto loggedBy = [&](const std::string& scenario) {
         std::vector<std::string> functions;
         for (const LogRecord& record : logged(scenario)) {
             const Line line = lineOf(record.text);
@@ -131,14 +131,14 @@ TEST_F(TranscriptPropertyTest, APropertyListIsLoggedWhereverItIsPassed) {
     for (const std::string kind : {"Lease", "Warranty"}) {
         const std::string adapter = "CMPI" + kind + ".cpp ";
         const std::string setting = "CMPI" + kind + "Setting.cpp ";
-        EXPECT_THAT(toldBy(kind + "-get"), IsEmpty());
-        EXPECT_THAT(toldBy(kind + "-get-listed"), ElementsAre(adapter + "getCMPIInstance"));
-        EXPECT_THAT(toldBy(kind + "-modify-listed"), ElementsAre(adapter + "modifyCMPIInstance"));
-        EXPECT_THAT(toldBy(kind + "Setting-enumerate-listed"),
+        EXPECT_THAT(loggedBy(kind + "-get"), IsEmpty());
+        EXPECT_THAT(loggedBy(kind + "-get-listed"), ElementsAre(adapter + "getCMPIInstance"));
+        EXPECT_THAT(loggedBy(kind + "-modify-listed"), ElementsAre(adapter + "modifyCMPIInstance"));
+        EXPECT_THAT(loggedBy(kind + "Setting-enumerate-listed"),
                     ElementsAre(setting + "getCMPIInstance", setting + "getCMPIInstance"));
-        EXPECT_THAT(toldBy(kind + "Setting-from-computer-listed"),
+        EXPECT_THAT(loggedBy(kind + "Setting-from-computer-listed"),
                     ElementsAre(setting + "getAssociator", adapter + "getCMPIInstance"));
-        EXPECT_THAT(toldBy(kind + "Setting-from-element-listed"),
+        EXPECT_THAT(loggedBy(kind + "Setting-from-element-listed"),
                     ElementsAre(setting + "getAssociator", "CMPIComputerSystem.cpp getCMPIInstance"));
     }
 }
@@ -167,20 +167,21 @@ TEST_F(TranscriptPropertyTest, AssociationsLogConstructionAndDestructionOfTheirP
         } else if (isFinished) {
             EXPECT_THAT(noted, ElementsAre(computer, element, "~" + adapter, "~" + element, "~" + computer));
         } else {
-            EXPECT_THAT(noted, ElementsAre(computer, element, "~" + element, "~" + computer)) << "not fully made";
+            EXPECT_THAT(noted, ElementsAre(computer, element, "~" + element, "~" + computer))
+                << "not constructed completely";
         }
     });
 }
 
 TEST_F(TranscriptPropertyTest, ACountOfZeroIsLoadedLikeAMissingFile) {
-    const auto told = [&](const char* scenario) {
-        std::vector<std::string> texts;
+    const auto messagesOfScenario = [&](const char* scenario) {
+        std::vector<std::string> strings;
         for (const LogRecord& record : logged(scenario)) {
-            texts.push_back(std::to_string(record.level) + " " + record.function + " " + record.text);
+            strings.push_back(std::to_string(record.level) + " " + record.function + " " + record.text);
         }
-        return texts;
+        return strings;
     };
-    EXPECT_EQ(told("load-with-zero-counts"), told("load-without-files"));
+    EXPECT_EQ(messagesOfScenario("load-with-zero-counts"), messagesOfScenario("load-without-files"));
 }
 
 TEST_F(TranscriptPropertyTest, OperationsWithAFixedStatusLogOneRecordEach) {
@@ -197,7 +198,7 @@ TEST_F(TranscriptPropertyTest, EveryDispatchedOperationLogsItsName) {
                             "LeaseAndWarranty_GetInstance", "LeaseAndWarranty_CreateInstance",
                             "LeaseAndWarranty_ModifyInstance", "LeaseAndWarranty_DeleteInstance",
                             "LeaseAndWarranty_AssociatorNames", "LeaseAndWarranty_Associators"));
-    EXPECT_EQ(logged("unknown-class").size(), 8U * 5U) << "rule, entry, class id, exit, rule";
+    EXPECT_EQ(logged("unknown-class").size(), 8U * 5U) << "separator, entry, class id, exit, separator";
 }
 
 TEST_F(TranscriptPropertyTest, ExceptionsAreLoggedWhereTheyAreThrownAndCaught) {

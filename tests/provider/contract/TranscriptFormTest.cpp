@@ -60,7 +60,7 @@ TEST_F(TranscriptPropertyTest, EachRequestIsEnclosedBySeparators) {
             const bool isMarker = log[index].file == markerFile;
             EXPECT_EQ(line.kind == Line::requestRule, isMarker && (log[index].line == 336 || log[index].line == 349));
             if (isMarker && log[index].line == 336) {
-                EXPECT_EQ(open, "") << "a request in a request";
+                EXPECT_EQ(open, "") << "a nested request";
                 ASSERT_GT(log.size(), index + 2);
                 const Line entry = lineOf(log[index + 1].text);
                 EXPECT_EQ(log[index + 1].line, 337);
@@ -82,7 +82,7 @@ TEST_F(TranscriptPropertyTest, EachRequestIsEnclosedBySeparators) {
                 EXPECT_EQ(open.empty(), !scenario.isRequest) << log[index].text;
             }
         }
-        EXPECT_EQ(open, "") << "a request without end";
+        EXPECT_EQ(open, "") << "a request without an end";
     });
 }
 
@@ -104,7 +104,7 @@ TEST_F(TranscriptPropertyTest, MarkersContainTheLineOfTheEntryPoint) {
             } else if (record.file == markerFile && line.kind == Line::exiting) {
                 EXPECT_EQ(line.line, entryPointLine);
             } else if (record.file == entryUnit && line.kind == Line::variable) {
-                EXPECT_GE(record.line, entryPointLine) << "the class id stands in the entry point";
+                EXPECT_GE(record.line, entryPointLine) << "the entry point logs the class id";
             }
         }
     });
@@ -113,7 +113,7 @@ TEST_F(TranscriptPropertyTest, MarkersContainTheLineOfTheEntryPoint) {
         EXPECT_EQ(lines.size(), 1U) << entryPoint;
         all.insert(lines.begin(), lines.end());
     }
-    EXPECT_EQ(all.size(), 8U) << "one for each operation that is dispatched";
+    EXPECT_EQ(all.size(), 8U) << "one per dispatched operation";
     EXPECT_GT(*all.begin(), 0);
     EXPECT_LE(*all.rbegin(), linesOfEntryUnit());
 }
@@ -171,7 +171,7 @@ public:
             expectLeft(open.back());
             open.pop_back();
         }
-        ASSERT_FALSE(open.empty()) << "left without having been entered: " << line.name;
+        ASSERT_FALSE(open.empty()) << "left but not entered: " << line.name;
         open.pop_back();
     }
 
@@ -187,7 +187,7 @@ private:
 
     static void expectLeft(const Function& function) {
         EXPECT_TRUE(function.mayBeLeft || function.name == "getLeaseMoniker")
-            << "entered and not left: " << function.name << " in " << function.file << ":" << function.line;
+            << "entered but not left: " << function.name << " in " << function.file << ":" << function.line;
     }
 
     std::vector<Function> open;

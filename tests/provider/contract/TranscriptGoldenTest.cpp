@@ -94,7 +94,7 @@ TEST(TranscriptGoldenFiles, AllBelongToScenarios) {
     for (const Scenario& scenario : scenarios()) {
         expected.insert(goldenFile(scenario).filename().string());
     }
-    EXPECT_EQ(expected.size(), scenarios().size()) << "a name twice";
+    EXPECT_EQ(expected.size(), scenarios().size()) << "duplicate name";
     std::set<std::string> found;
     for (const auto& entry : fs::directory_iterator(CONTRACT_GOLDEN)) {
         found.insert(entry.path().filename().string());

@@ -120,7 +120,7 @@ Scenario ofAssociation(const AssociationKind& kind, const std::string& action,
                        std::function<void(Library&, const AssociationKind&)> act) {
     return {std::string(kind.association).substr(6) + "-" + action, [kind, computers, act](TranscriptTest& test) {
                 test.writeData(kind.dataFile, recordFile(kind, {ofAlpha, "B"}));
-                test.knowComputers(computers);
+                test.setComputers(computers);
                 act(test.begin(), kind);
             }};
 }
@@ -339,7 +339,7 @@ testsupport::ProviderLibrary& TranscriptTest::begin() {
     return provider();
 }
 
-void TranscriptTest::knowComputers(const std::vector<std::string>& names) {
+void TranscriptTest::setComputers(const std::vector<std::string>& names) {
     std::vector<Instance> computers;
     std::transform(names.begin(), names.end(), std::back_inserter(computers), computerSystem);
     broker.serve("VELKO_ComputerSystem", std::move(computers));

@@ -43,7 +43,7 @@ public:
     testsupport::ProviderLibrary& begin();
 
     /** Sets the computer systems of the object manager. */
-    void knowComputers(const std::vector<std::string>& names);
+    void setComputers(const std::vector<std::string>& names);
     ///@}
 };
 

@@ -105,7 +105,7 @@ bool reportsAt(const fs::path& source, int line) {
 TEST_F(TranscriptPropertyTest, EachLineNumberBelongsToATraceStatementInTheDocumentedSource) {
     const auto rows = documentedRows();
     ASSERT_GE(rows.size(), 9U);
-    std::set<std::string> headersSeen;
+    std::set<std::string> foundHeaders;
     forEachRecord([&](const LogRecord& record, const Line&) {
         if (record.file == markerFile) {
             return;
@@ -115,10 +115,10 @@ TEST_F(TranscriptPropertyTest, EachLineNumberBelongsToATraceStatementInTheDocume
                                         [&](const fs::path& source) { return reportsAt(source, record.line); });
         ASSERT_NE(found, sources.end()) << record.function << " " << record.text;
         if (found->extension() == ".h") {
-            headersSeen.insert(found->filename());
+            foundHeaders.insert(found->filename());
         }
     });
-    EXPECT_THAT(headersSeen,
+    EXPECT_THAT(foundHeaders,
                 testing::UnorderedElementsAre("ElementAdapterImpl.h", "ProductAdapterImpl.h", "RecordAdapterImpl.h",
                                               "RecordBaseImpl.h", "RecordElementImpl.h", "SettingAdapterImpl.h",
                                               "SettingElementImpl.h"));
