@@ -48,7 +48,7 @@ unsigned short classIdOf(const CallSite& site, Class requestedClass) {
     return classId;
 }
 
-/** Returns the namespace of a new instance. Both calls write the status that the request returns. */
+/** Returns the namespace of a new instance; empty on failure. Writes the status that the request returns. */
 std::string nameSpaceOf(const CMPIObjectPath* ref, CMPIStatus& status) {
     if (ref == nullptr) {
         return {};

@@ -133,7 +133,7 @@ struct _CMPIBrokerEncFT {
                                      CMPIStatus* rc);
     /** Creates an empty list of method arguments. */
     CMPIArgs* (*newArgs)(const CMPIBroker* broker, CMPIStatus* rc);
-    /** Creates a string. Null text creates a string with null characters. */
+    /** Creates a string. Null creates a string without characters. */
     CMPIString* (*newString)(const CMPIBroker* broker, const char* text, CMPIStatus* rc);
     /** Creates an array of `size` null elements; `type` is the type of an element. */
     CMPIArray* (*newArray)(const CMPIBroker* broker, CMPICount size, CMPIType type, CMPIStatus* rc);

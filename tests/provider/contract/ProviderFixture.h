@@ -67,9 +67,9 @@ testing::Matcher<const Outcome&> isRefused(CMPIrc rc);
 /**
  * The provider library with a new agent and a new data directory for each test.
  *
- * The library is loaded and its interfaces are created by the first call of provider(), so the provider loads files
- * that were written before. The agent's libraries are loaded and unloaded with it. At the end, the library is unloaded
- * and must no longer be in the process.
+ * The first call of provider() loads the library and creates its interfaces, so the provider loads the files that the
+ * test wrote before. The agent's libraries are loaded and unloaded with it. At the end, the fixture unloads the
+ * library, which must then no longer be in the process.
  */
 class ProviderTest : public testing::Test {
 protected:

@@ -62,7 +62,7 @@ protected:
     /** Returns the log channel's records of a scenario. */
     std::vector<LogRecord> logged(const std::string& scenarioName);
 
-    /** Returns the names in the records of a kind and a source file. */
+    /** Returns the function and variable names of the records with that kind and source file. */
     std::vector<std::string> namesOf(const std::string& scenarioName, Line::Kind kind, const std::string& file);
 };
 

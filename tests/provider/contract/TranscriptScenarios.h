@@ -32,7 +32,7 @@ public:
     /** Runs a scenario and returns its records, both channels, in order. */
     std::vector<LogRecord> transcriptOf(const Scenario& scenario);
 
-    /** @name For scenarios */
+    /** @name Functions of scenarios */
     ///@{
     using ProviderTest::blockData;
     using ProviderTest::provider;
