@@ -12,10 +12,9 @@ namespace KO::LeaseWarrantyProvider {
  * Returns whether the field was read. On failure, sets the stream's failbit and keeps the value.
  */
 ///@{
-bool extract(std::istream& stream,
-             unsigned int& number);  ///< decimal, optionally with leading zeros or a plus sign; no minus sign
-bool extract(std::istream& stream, bool& flag);  ///< the number 0 or 1, optionally with leading zeros or a plus sign
-bool extract(std::istream& stream, std::string& word);  ///< up to the next white space
+bool extract(std::istream& stream, unsigned int& number);  ///< decimal; may have a plus sign or leading zeros
+bool extract(std::istream& stream, bool& flag);            ///< 0 or 1; may have a plus sign or leading zeros
+bool extract(std::istream& stream, std::string& word);     ///< up to the next white space
 ///@}
 
 /**
