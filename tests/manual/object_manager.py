@@ -1,9 +1,10 @@
-"""Stands for an object manager with the gate registered: cimhost answers each request, as SFCB would send it.
+"""A stand-in for an object manager: cimhost performs each request, with the gate or without it, as SFCB would.
 
 Answers CIM-XML over HTTP, as far as the clients in the documents need it; and, in the module pywbem of stand-ins/, the
 calls that a Python client makes.
 """
 
+import contextlib
 import http.server
 import json
 import re
@@ -25,12 +26,14 @@ def quoted(text):
 
 class Manager:
     """@param build      directory with bin/ and share/
-    @param environment  of cimhost"""
+    @param environment  of cimhost
+    @param provider     "gate", or "bare" for the provider without it"""
 
-    def __init__(self, build, environment):
+    def __init__(self, build, environment, provider="gate"):
         data = build / "share" / "lease-warranty-provider"
+        registration = {"gate": "gate/LeaseAndWarrantyGate.reg", "bare": "LeaseAndWarrantyProvider.reg"}[provider]
         self.command = [str(build / "bin" / "cimhost"), "--as", "sfcb", "--format", "json", "--registration",
-                        str(data / "gate"), "--registration", str(data / "OstrelComputerSystemProvider.reg")]
+                        str(data / registration), "--registration", str(data / "OstrelComputerSystemProvider.reg")]
         self.environment = environment
         self.asked = []  # the operations, in their order
 
@@ -40,7 +43,8 @@ class Manager:
                                text=True, env=self.environment)
         if ended.returncode != 0:
             code = re.match(r"cimhost: error (\d+) \(\w+\): (.*)", ended.stderr, re.S)
-            raise CimError(code[1] if code else "1", code[2] if code else ended.stderr)
+            wrong_usage = "4" if ended.returncode == 2 else "1"
+            raise CimError(code[1] if code else wrong_usage, code[2] if code else ended.stderr)
         return json.loads(ended.stdout) if ended.stdout else None
 
 
@@ -48,8 +52,12 @@ class Manager:
 
 
 def path_of(element):
-    """The text of an INSTANCENAME's path."""
-    keys = [f'{key.get("NAME")}={quoted(key.findtext("KEYVALUE") or "")}' for key in element.findall("KEYBINDING")]
+    """The WBEM URI of an INSTANCENAME."""
+    keys = []
+    for key in element.findall("KEYBINDING"):
+        reference = key.find(".//INSTANCENAME")
+        value = key.findtext("KEYVALUE") or "" if reference is None else path_of(reference)
+        keys.append(f'{key.get("NAME")}={quoted(value)}')
     return element.get("CLASSNAME") + ("." + ",".join(keys) if keys else "")
 
 
@@ -59,15 +67,27 @@ def values_of(element):
             if each.find("VALUE") is not None]
 
 
+def namespace_of(call):
+    return "/".join(each.get("NAME") for each in call.findall("LOCALNAMESPACEPATH/NAMESPACE"))
+
+
 def parameters_of(call):
-    found = {}
-    for parameter in call.findall("IPARAMVALUE"):
-        child = parameter[0] if len(parameter) else None
-        if child is None or child.tag == "VALUE":
-            continue
-        name = {"CLASSNAME": lambda: child.get("NAME"), "INSTANCENAME": lambda: path_of(child)}
-        found[parameter.get("NAME")] = name.get(child.tag, lambda: child)()
-    return found
+    """The parameters by their names; classes and instances that are named, as URIs with the namespace."""
+    uri = namespace_of(call) + ":"
+    read = {"CLASSNAME": lambda child: uri + child.get("NAME"), "INSTANCENAME": lambda child: uri + path_of(child),
+            "VALUE": lambda child: child.text or "", "VALUE.ARRAY": lambda child: [each.text for each in child]}
+    return {parameter.get("NAME"): read.get(parameter[0].tag, lambda child: child)(parameter[0])
+            for parameter in call.findall("IPARAMVALUE") if len(parameter)}
+
+
+def options_of(given):
+    """The options of cimhost that say what a request asks for."""
+    options = [f"--property={name}" for name in given.get("PropertyList", [])]
+    for parameter, option in (("AssocClass", "assoc-class"), ("ResultClass", "result-class"), ("Role", "role"),
+                              ("ResultRole", "result-role")):
+        if parameter in given:
+            options.append(f'--{option}={given[parameter].rpartition(":")[2]}')
+    return options
 
 
 # --- what goes out -------------------------------------------------------------------------------------------------
@@ -102,9 +122,13 @@ def instance_element(instance, parent):
 def class_element(listed, parent):
     element = xml.SubElement(parent, "CLASS", NAME=listed["class"])
     for each in listed["properties"]:
-        one = xml.SubElement(element, "PROPERTY", NAME=each["name"], TYPE=each["type"])
-        if each["key"]:
-            xml.SubElement(xml.SubElement(one, "QUALIFIER", NAME="Key", TYPE="boolean"), "VALUE").text = "TRUE"
+        if each["type"] == "reference":
+            one = xml.SubElement(element, "PROPERTY.REFERENCE", NAME=each["name"],
+                                 REFERENCECLASS=each["referenceClass"])
+        else:
+            one = xml.SubElement(element, "PROPERTY", NAME=each["name"], TYPE=each["type"])
+        for qualifier in ["Key"] * each["key"] + ["Write"] * each["writable"]:
+            xml.SubElement(xml.SubElement(one, "QUALIFIER", NAME=qualifier, TYPE="boolean"), "VALUE").text = "TRUE"
 
 
 def named_element(instance, parent):
@@ -113,24 +137,55 @@ def named_element(instance, parent):
     instance_element(instance, element)
 
 
-def answer(manager, operation, given, value):
+def located_element(path, parent):
+    element = xml.SubElement(parent, "INSTANCEPATH")
+    place = xml.SubElement(element, "NAMESPACEPATH")
+    xml.SubElement(place, "HOST").text = "localhost"
+    names = xml.SubElement(place, "LOCALNAMESPACEPATH")
+    for name in path["namespace"].split("/"):
+        xml.SubElement(names, "NAMESPACE", NAME=name)
+    name_element(path, element)
+
+
+def object_path_element(path, parent):
+    located_element(path, xml.SubElement(parent, "OBJECTPATH"))
+
+
+def object_element(instance, parent):
+    element = xml.SubElement(parent, "VALUE.OBJECTWITHPATH")
+    located_element(instance["path"], element)
+    instance_element(instance, element)
+
+
+# What lists objects: the command of cimhost, the parameter that names where it begins, the form of an object.
+LISTINGS = {"EnumerateInstances": ("ei", "ClassName", named_element),
+            "EnumerateInstanceNames": ("ein", "ClassName", name_element),
+            "Associators": ("ai", "ObjectName", object_element),
+            "AssociatorNames": ("ain", "ObjectName", object_path_element),
+            "References": ("ri", "ObjectName", object_element),
+            "ReferenceNames": ("rin", "ObjectName", object_path_element)}
+
+
+def answer(manager, namespace, operation, given, value):
     """Does one operation, and puts what it returns into an element."""
     if operation == "GetClass":
-        for listed in manager.ask("classes"):
-            if listed["class"] == given["ClassName"]:
-                class_element(listed, value)
-    elif operation in ("EnumerateInstanceNames", "EnumerateInstances"):
-        names = operation == "EnumerateInstanceNames"
-        for each in manager.ask("ein" if names else "ei", given["ClassName"]):
-            (name_element if names else named_element)(each, value)
+        listed = [each for each in manager.ask("classes") if f'{namespace}:{each["class"]}' == given["ClassName"]]
+        if not listed:
+            raise CimError("6", "There is no such class.")
+        class_element(listed[0], value)
+    elif operation in LISTINGS:
+        command, start, element = LISTINGS[operation]
+        for each in manager.ask(command, given[start], *options_of(given)):
+            element(each, value)
     elif operation == "GetInstance":
-        instance_element(manager.ask("gi", given["InstanceName"]), value)
+        instance_element(manager.ask("gi", given["InstanceName"], *options_of(given)), value)
     elif operation == "CreateInstance":
         new = given["NewInstance"]
-        name_element(manager.ask("ci", new.get("CLASSNAME"), *values_of(new)), value)
+        name_element(manager.ask("ci", f'{namespace}:{new.get("CLASSNAME")}', *values_of(new)), value)
     elif operation == "ModifyInstance":
         modified = given["ModifiedInstance"]
-        manager.ask("mi", path_of(modified.find("INSTANCENAME")), *values_of(modified.find("INSTANCE")))
+        manager.ask("mi", f'{namespace}:{path_of(modified.find("INSTANCENAME"))}',
+                    *values_of(modified.find("INSTANCE")))
     elif operation == "DeleteInstance":
         manager.ask("di", given["InstanceName"])
     else:
@@ -145,13 +200,14 @@ def message(manager, request):
     response = xml.SubElement(simple, "IMETHODRESPONSE", NAME=operation)
     value = xml.Element("IRETURNVALUE")
     try:
-        answer(manager, operation, parameters_of(call), value)
+        answer(manager, namespace_of(call), operation, parameters_of(call), value)
         if len(value) or not operation.startswith(("Modify", "Delete")):
             response.append(value)
     except CimError as error:
         xml.SubElement(response, "ERROR", CODE=error.code, DESCRIPTION=str(error))
-    # Elements that begin and end at once are too much for wbemcli.
-    return b'<?xml version="1.0" encoding="utf-8"?>\n' + xml.tostring(cim, short_empty_elements=False)
+    # wbemcli reads neither elements that begin and end at once nor references to characters.
+    text = xml.tostring(cim, encoding="unicode", short_empty_elements=False)
+    return ('<?xml version="1.0" encoding="utf-8"?>\n' + text).encode()
 
 
 class Server:
@@ -166,7 +222,8 @@ class Server:
                                    ("Content-Length", str(len(body)))):
                     self.send_header(name, text)
                 self.end_headers()
-                self.wfile.write(body)
+                with contextlib.suppress(BrokenPipeError):  # The client may have left.
+                    self.wfile.write(body)
 
             def log_message(self, *_):
                 pass
