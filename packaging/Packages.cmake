@@ -121,7 +121,8 @@ computer's asset identification and the identity of its management agent.
 With it comes a gate that lets one request at a time through and answers as
 the CIM standard has it, and the command lease-warranty-register, which
 registers the classes with the object manager.")
-set(CPACK_DEBIAN_PROVIDER_PACKAGE_SUGGESTS cimhost)
+# What its acceptance test of object managers runs with.
+set(CPACK_DEBIAN_PROVIDER_PACKAGE_SUGGESTS "cimhost, python3, sblim-wbemcli")
 
 law_package(agent ostrel-reference-agent
     DOCUMENTS agent.md

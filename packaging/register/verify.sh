@@ -116,4 +116,5 @@ verify() {
         verify_class "$class"
     done
     [ "$sfcb" = no ] || ! is_local || sfcb_look_for_trimming
+    say "to test every operation of the classes, run $data/manager-test URL"
 }

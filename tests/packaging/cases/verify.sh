@@ -7,6 +7,7 @@ for client in wbemcli pywbemcli cimcli; do
     register verify
     ends_with 0
     [ "$(grep -c ': served, 2 instances$' "$work/output")" -eq 7 ] || complain "not every class is served"
+    [ -x "$(sed -n 's|.*, run \(/.*/manager-test\) URL$|\1|p' "$work/output")" ] || complain "names no acceptance test"
 done
 
 begin "A class that is not served fails the verification, and the others are still looked at"
