@@ -54,7 +54,8 @@ TEST_F(ResultTest, RefusesWhatIsNoObject) {
     EXPECT_EQ(result->ft->returnError(result, nullptr).rc, CMPI_RC_ERR_INVALID_PARAMETER);
     const CMPIValue value{};
     EXPECT_EQ(result->ft->returnData(result, &value, CMPI_filter).rc, CMPI_RC_ERR_INVALID_DATA_TYPE);
-    EXPECT_TRUE(events.empty());
+    EXPECT_EQ(events.size(), 3U);
+    EXPECT_EQ(eventsOf<cimhost::NullResult>(events).size(), 3U) << "each null pointer is recorded, nothing is returned";
 }
 
 TEST_F(ResultTest, CannotBeCloned) {
