@@ -139,7 +139,7 @@ cimhost::ObjectPath classPath(const std::string& className) {
 }
 
 cimhost::NamedValue textValue(const std::string& name, const std::string& text) {
-    return {name, {CMPI_string, false, false, {text}}};
+    return {name, cimhost::Value::of(text)};
 }
 
 Request enumInstances(const std::string& className, std::size_t answers) {

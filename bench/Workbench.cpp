@@ -19,18 +19,19 @@ cimhost::Instance computerSystem(const std::string& name) {
 
 }  // namespace
 
-cimhost::Answer<std::vector<cimhost::Instance>> ComputerSystems::enumerateInstances(const cimhost::ContextEntries&,
-                                                                                    const cimhost::ObjectPath& path,
-                                                                                    const cimhost::PropertyList&) {
-    if (path.className != "VELKO_ComputerSystem") {
-        return {{CMPI_RC_ERR_INVALID_CLASS, "only computers are served"}, {}};
+cimhost::Response ComputerSystems::perform(cimhost::Request request) {
+    if (request.operation != cimhost::Operation::enumerateInstances) {
+        return cimhost::notSupported(request.operation);
+    }
+    if (request.path.className != "VELKO_ComputerSystem") {
+        return cimhost::Response::failed({CMPI_RC_ERR_INVALID_CLASS, "only computers are served"});
     }
     std::vector<cimhost::Instance> instances;
     instances.push_back(computerSystem(names::computer));
     while (instances.size() < count) {
         instances.push_back(computerSystem("other" + std::to_string(instances.size())));
     }
-    return {{}, std::move(instances)};
+    return cimhost::Response::ofInstances(std::move(instances));
 }
 
 Workbench::Workbench(AgentStays agentStays) {

@@ -5,7 +5,6 @@
 #include "RecordFile.h"
 #include "Rows.h"
 #include "broker/Broker.h"
-#include "broker/UpCalls.h"
 
 #include <cstddef>
 #include <optional>
@@ -15,15 +14,13 @@
 
 namespace bench {
 
-/** Answers what the provider asks the object manager for: the instances of the managed computers. */
+/** Responds to requests of the provider with the instances of the managed computers. */
 class ComputerSystems : public cimhost::UpCalls {
 public:
-    /** How many computers there are; the first is the one that the agent manages. */
+    /** Number of computers; the first is the one that the agent manages. */
     std::size_t count = 1;
 
-    cimhost::Answer<std::vector<cimhost::Instance>> enumerateInstances(const cimhost::ContextEntries& context,
-                                                                       const cimhost::ObjectPath& path,
-                                                                       const cimhost::PropertyList& list) override;
+    cimhost::Response perform(cimhost::Request request) override;
 };
 
 /** Whether the agent's libraries stay in the process when the provider goes. */

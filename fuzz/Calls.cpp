@@ -26,14 +26,16 @@ constexpr std::array actions{Action::createInstance,     Action::createInstance,
                              Action::associationCleanup};
 
 const char* nameOf(Action action) {
-    constexpr const char* names[] = {"enumerateInstances", "enumerateInstanceNames",
-                                     "getInstance",        "createInstance",
-                                     "modifyInstance",     "deleteInstance",
-                                     "execQuery",          "cleanup",
-                                     "associators",        "associatorNames",
-                                     "references",         "referenceNames",
-                                     "associationCleanup", "restart"};
-    return names[static_cast<std::size_t>(action)];
+    switch (action) {
+        case Action::cleanup:
+            return "cleanup";
+        case Action::associationCleanup:
+            return "associationCleanup";
+        case Action::restart:
+            return "restart";
+        default:
+            return cimhost::nameOf(static_cast<cimhost::Operation>(action));
+    }
 }
 
 const Names classes{"VELKO_Lease",
@@ -127,9 +129,9 @@ std::string aptText(Bytes& bytes) {
     return texts()[bytes.below(aptTexts)];
 }
 
-/** Without characters, yet there, or null: as some object managers hand texts over. */
-Value hollow(Bytes& bytes) {
-    return cimhost::hollowText(bytes.below(2) == 0);
+/** A string object without characters, which some object managers pass to providers. */
+Value withoutCharacters(Bytes& bytes) {
+    return bytes.below(2) == 0 ? Value::nullStringObject() : Value::stringWithoutCharacters();
 }
 
 std::uint32_t number(Bytes& bytes) {
@@ -159,13 +161,13 @@ Value nextValue(Bytes& bytes) {
         case 6:
             return testsupport::dateTime(date(bytes));
         case 7:
-            return hollow(bytes);
+            return withoutCharacters(bytes);
         case 8:
             return testsupport::nullOf(bytes.below(2) == 1 ? CMPI_string : CMPI_uint32);
         case 9:
             return testsupport::reference({"", bytes.pick(nameSpaces), bytes.pick(classes), {}});
         case 10:
-            return {CMPI_string, true, false, {nextText(bytes)}};
+            return Value::array(CMPI_string, {nextText(bytes)});
         case 11:
             return testsupport::real64(1.5);
         default:

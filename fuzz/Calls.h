@@ -2,8 +2,7 @@
 
 #include "Bytes.h"
 
-#include "broker/UpCalls.h"
-#include "model/PropertyList.h"
+#include "model/Request.h"
 #include "model/Value.h"
 
 #include <optional>
@@ -13,7 +12,7 @@
 
 namespace fuzz {
 
-/** What is done: an operation of the function tables, or something around them. */
+/** An operation, with the number that cimhost::Operation gives it, or something else that is done to a provider. */
 enum class Action {
     enumerateInstances,
     enumerateInstanceNames,
@@ -22,13 +21,13 @@ enum class Action {
     modifyInstance,
     deleteInstance,
     execQuery,
-    cleanup,
-    associators,  ///< from here on those of the association interface
+    associators,
     associatorNames,
     references,
     referenceNames,
+    cleanup,
     associationCleanup,
-    restart,  ///< the library goes and comes again
+    restart,  ///< the library is unloaded and loaded again
 };
 
 /** A call with its arguments, of which it uses those that its action has; a null pointer where there is none. */

@@ -2,7 +2,7 @@
 #include "Target.h"
 
 #include "framework/PropertyText.h"
-#include "operations/Request.h"
+#include "model/Request.h"
 #include "schema/MofWriter.h"
 #include "schema/Names.h"
 #include "support/AssetModel.h"
@@ -156,7 +156,7 @@ public:
 
     void make(const Call& call) {
         const Kept before;
-        const cimhost::RawAnswer answer = subject.make(call);
+        const cimhost::ProviderResponse answer = subject.make(call);
         try {
             requireRight(call, answer, before);
         } catch (const Violation& violation) {
@@ -165,7 +165,7 @@ public:
     }
 
 private:
-    static void requireRight(const Call& call, const cimhost::RawAnswer& answer, const Kept& before) {
+    static void requireRight(const Call& call, const cimhost::ProviderResponse& answer, const Kept& before) {
         const Kept after;
         require(!answer.threw, "no exception leaves the gate: " + answer.status.message);
         require(answer.hasMessage == (answer.status.rc != CMPI_RC_OK), "a status but OK has a message");
@@ -188,7 +188,7 @@ private:
         return action == Action::createInstance || action == Action::modifyInstance || action == Action::deleteInstance;
     }
 
-    static void requireChange(const Call& call, const cimhost::RawAnswer& answer, const Kept& before,
+    static void requireChange(const Call& call, const cimhost::ProviderResponse& answer, const Kept& before,
                               const Kept& after) {
         const Store* store = storeOf(call.path.className);
         if (store == nullptr) {
@@ -207,8 +207,8 @@ private:
         }
     }
 
-    static void requireCreated(const Store& store, const Call& call, const cimhost::RawAnswer& answer, Records expected,
-                               const Records& after) {
+    static void requireCreated(const Store& store, const Call& call, const cimhost::ProviderResponse& answer,
+                               Records expected, const Records& after) {
         const auto paths = cimhost::eventsOf<cimhost::ObjectPath>(answer.events);
         require(paths.size() == 1 && answer.doneCount() == 1, "a creation answers a path");
         const auto identifier = keyText(paths.front(), identifierName);
@@ -265,7 +265,7 @@ private:
     }
 
     /** Enumerations and gets of records give what there is. */
-    static void requireReading(const Call& call, const cimhost::RawAnswer& answer, const Kept& kept) {
+    static void requireReading(const Call& call, const cimhost::ProviderResponse& answer, const Kept& kept) {
         const Store* store = storeOf(call.path.className);
         if (store == nullptr || call.action > Action::getInstance) {
             return;
@@ -296,7 +296,7 @@ private:
     }
 
     static std::vector<std::vector<std::string>> shown(const RecordModel& model, const Call& call,
-                                                       const cimhost::RawAnswer& answer) {
+                                                       const cimhost::ProviderResponse& answer) {
         std::vector<std::vector<std::string>> all;
         for (const auto& instance : cimhost::eventsOf<cimhost::Instance>(answer.events)) {
             all.push_back(model.shownFields(instance));

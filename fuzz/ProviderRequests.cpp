@@ -2,7 +2,7 @@
 #include "Target.h"
 
 #include "LeaseAndWarrantyProvider.h"
-#include "operations/Request.h"
+#include "model/Request.h"
 #include "schema/MofWriter.h"
 #include "schema/Names.h"
 #include "support/AssetModel.h"
@@ -48,7 +48,7 @@ public:
 
     void make(const Call& call) {
         const Expectation expected = expect(call);
-        const cimhost::RawAnswer answer = subject.make(call);
+        const cimhost::ProviderResponse answer = subject.make(call);
         try {
             requireAnswer(call, expected, answer);
             leases.requireAgreement();
@@ -114,7 +114,7 @@ private:
         return other(isServed ? CMPI_RC_OK : CMPI_RC_ERR_INVALID_CLASS);
     }
 
-    void requireAnswer(const Call& call, const Expectation& expected, const cimhost::RawAnswer& answer) const {
+    void requireAnswer(const Call& call, const Expectation& expected, const cimhost::ProviderResponse& answer) const {
         require(!answer.threw, "no exception leaves the provider: " + answer.status.message);
         require(!answer.hasMessage, "a status has no message");
         requireSame(answer.status.rc, expected.rc, "status");
@@ -141,7 +141,7 @@ private:
     }
 
     /** The answer in the expectation's form. */
-    std::vector<std::vector<std::string>> shownBy(const Call& call, const cimhost::RawAnswer& answer) const {
+    std::vector<std::vector<std::string>> shownBy(const Call& call, const cimhost::ProviderResponse& answer) const {
         std::vector<std::vector<std::string>> shown;
         const Store* store = storeOf(call.path.className);
         const testsupport::RecordModel model(store == nullptr ? testsupport::ModelFields{} : store->fields());

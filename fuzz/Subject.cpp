@@ -3,8 +3,6 @@
 #include "LeaseBase.h"
 #include "RecordFile.h"
 #include "WarrantyBase.h"
-#include "broker/PropertyLists.h"
-#include "operations/ClassShapes.h"
 #include "schema/MofReader.h"
 #include "schema/Names.h"
 #include "support/AgentEnvironment.h"
@@ -48,29 +46,27 @@ void reload() {
     new (&cache) RecordCache<RecordStore>;
 }
 
-const char* charactersOf(const std::optional<std::string>& text) {
-    return text ? text->c_str() : nullptr;
-}
-
 /** What the object manager knows of computers: that of the agent; none; two, one without a name; or it fails. */
 class Computers : public cimhost::UpCalls {
 public:
     void choose(std::size_t itsKind) { kind = itsKind % 4; }
 
-    cimhost::Answer<std::vector<cimhost::Instance>> enumerateInstances(const cimhost::ContextEntries&,
-                                                                       const cimhost::ObjectPath& path,
-                                                                       const cimhost::PropertyList&) override {
+    cimhost::Response perform(cimhost::Request request) override {
+        if (request.operation != cimhost::Operation::enumerateInstances) {
+            return cimhost::notSupported(request.operation);
+        }
+        const cimhost::ObjectPath& path = request.path;
         if (kind == 3 || !cimhost::sameName(path.className, computerClass)) {
-            return {{CMPI_RC_ERR_FAILED, "no computers"}, {}};
+            return cimhost::Response::failed({CMPI_RC_ERR_FAILED, "no computers"});
         }
         std::vector<cimhost::Instance> found;
         if (kind != 1) {
             found.push_back(computer(path.nameSpace, testsupport::text("testhost")));
         }
         if (kind == 2) {
-            found.push_back(computer(path.nameSpace, cimhost::hollowText(false)));
+            found.push_back(computer(path.nameSpace, cimhost::Value::stringWithoutCharacters()));
         }
-        return {{}, std::move(found)};
+        return cimhost::Response::ofInstances(std::move(found));
     }
 
 private:
@@ -81,11 +77,11 @@ private:
     std::size_t kind = 0;
 };
 
-cimhost::ClassShapeLookup shapes() {
-    static const cimhost::ClassShapeLookup known = [] {
+cimhost::ClassInfoLookup classes() {
+    static const cimhost::ClassInfoLookup known = [] {
         cimhost::Schema schema;
         cimhost::MofReader(schema).readFile(SCHEMA_MOF);
-        return cimhost::classShapes(schema);
+        return cimhost::classInfos(schema);
     }();
     return known;
 }
@@ -98,60 +94,35 @@ struct Manager {
     }
 
     Computers computers{};
-    cimhost::Broker broker{{shapes(), &computers, {}, nullptr, {}}};
+    cimhost::Broker broker{{classes(), &computers, {}, nullptr, true}};
     Interfaces interfaces = openInterfaces(broker.handle());
 };
 
-/** What a function of the tables is called with. */
-struct Arguments {
-    const CMPIContext* context;
-    const CMPIResult* result;
-    const CMPIObjectPath* path;
-    const CMPIInstance* instance;
-    const char** properties;
-};
-
-CMPIStatus callInstances(CMPIInstanceMI* mi, const Call& call, const Arguments& with) {
-    const CMPIInstanceMIFT& table = *mi->ft;
-    switch (call.action) {
-        case Action::enumerateInstances:
-            return table.enumerateInstances(mi, with.context, with.result, with.path, with.properties);
-        case Action::enumerateInstanceNames:
-            return table.enumerateInstanceNames(mi, with.context, with.result, with.path);
-        case Action::getInstance:
-            return table.getInstance(mi, with.context, with.result, with.path, with.properties);
-        case Action::createInstance:
-            return table.createInstance(mi, with.context, with.result, with.path, with.instance);
-        case Action::modifyInstance:
-            return table.modifyInstance(mi, with.context, with.result, with.path, with.instance, with.properties);
-        case Action::deleteInstance:
-            return table.deleteInstance(mi, with.context, with.result, with.path);
-        case Action::execQuery:
-            return table.execQuery(mi, with.context, with.result, with.path, "WQL", nullptr);
-        default:
-            return table.cleanup(mi, with.context, 0);
-    }
+/** The instance that the action passes; null where it passes none. */
+const CMPIInstance* instanceOf(const Call& call, cimhost::RequestScope& scope) {
+    return call.instance ? scope.instance(*call.instance) : nullptr;
 }
 
-CMPIStatus callAssociations(CMPIAssociationMI* mi, const Call& call, const Arguments& with) {
-    const CMPIAssociationMIFT& table = *mi->ft;
-    const char* association = charactersOf(call.filter.associationClass);
-    const char* resultClass = charactersOf(call.filter.resultClass);
-    const char* role = charactersOf(call.filter.role);
-    const char* resultRole = charactersOf(call.filter.resultRole);
+CMPIStatus perform(const Interfaces& interfaces, const Call& call, cimhost::RequestScope& scope,
+                   const CMPIContext* context, const CMPIResult* result) {
+    CMPIInstanceMI* const instances = interfaces.instances;
+    CMPIAssociationMI* const associations = interfaces.associations;
+    const CMPIObjectPath* path = scope.objectPath(call.path);
+    cimhost::Request request;
+    request.properties = call.properties;
+    request.filter = call.filter;
     switch (call.action) {
-        case Action::associators:
-            return table.associators(mi, with.context, with.result, with.path, association, resultClass, role,
-                                     resultRole, with.properties);
-        case Action::associatorNames:
-            return table.associatorNames(mi, with.context, with.result, with.path, association, resultClass, role,
-                                         resultRole);
-        case Action::references:
-            return table.references(mi, with.context, with.result, with.path, resultClass, role, with.properties);
-        case Action::referenceNames:
-            return table.referenceNames(mi, with.context, with.result, with.path, resultClass, role);
+        case Action::cleanup:
+            return instances->ft->cleanup(instances, context, 0);
+        case Action::associationCleanup:
+            return associations->ft->cleanup(associations, context, 0);
+        case Action::execQuery:
+            return instances->ft->execQuery(instances, context, result, path, "WQL", nullptr);
         default:
-            return table.cleanup(mi, with.context, 0);
+            request.operation = static_cast<cimhost::Operation>(call.action);
+            return cimhost::isAssociationOperation(request.operation)
+                       ? cimhost::callOperation(associations, request, context, result, path)
+                       : cimhost::callOperation(instances, request, context, result, path, instanceOf(call, scope));
     }
 }
 
@@ -200,21 +171,16 @@ void Subject::restart() {
     reload<WarrantyStoreTraits>();
 }
 
-cimhost::RawAnswer Subject::make(const Call& call) {
+cimhost::ProviderResponse Subject::make(const Call& call) {
     if (call.action == Action::restart) {
         restart();
         return {};
     }
     Manager& manager = Manager::only();
-    return cimhost::runCall(
-        manager.broker, {}, [&](cimhost::RequestScope& scope, const CMPIContext* context, const CMPIResult* result) {
-            cimhost::CPropertyList properties(call.properties);
-            const CMPIInstance* instance = call.instance ? scope.instance(*call.instance) : nullptr;
-            const Arguments arguments{context, result, scope.objectPath(call.path), instance, properties.get()};
-            return call.action >= Action::associators
-                       ? callAssociations(manager.interfaces.associations, call, arguments)
-                       : callInstances(manager.interfaces.instances, call, arguments);
-        });
+    return cimhost::runCall(manager.broker, {},
+                            [&](cimhost::RequestScope& scope, const CMPIContext* context, const CMPIResult* result) {
+                                return perform(manager.interfaces, call, scope, context, result);
+                            });
 }
 
 }  // namespace fuzz

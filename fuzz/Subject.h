@@ -52,7 +52,7 @@ public:
     explicit Subject(std::size_t computers);
 
     /** Calls a function of the tables; nullptr is passed where the call has nothing. */
-    cimhost::RawAnswer make(const Call& call);
+    cimhost::ProviderResponse make(const Call& call);
 
     /** Lets the tables go and reads them again. */
     static void restart();

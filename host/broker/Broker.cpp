@@ -5,7 +5,7 @@
 #include <utility>
 #include <vector>
 
-#include "broker/Boundary.h"
+#include "broker/ErrorTranslation.h"
 #include "schema/Names.h"
 
 namespace cimhost {
@@ -23,32 +23,39 @@ std::vector<Scope>& scopes() {
     return ofThread;
 }
 
-UpCalls& noUpCalls() {
-    static UpCalls none;
-    return none;
-}
+/** Supports no operation. */
+class NoUpCalls : public UpCalls {
+public:
+    Response perform(Request request) override { return notSupported(request.operation); }
+};
 
 BrokerOptions completed(BrokerOptions options) {
     if (options.tables == nullptr) {
-        options.tables = &tablesOf(options.manager);
+        options.tables = &standardTables();
     }
     if (options.upCalls == nullptr) {
-        options.upCalls = &noUpCalls();
+        static NoUpCalls none;
+        options.upCalls = &none;
     }
     return options;
 }
 
-/** The standard's broker points to tables without const; nobody writes to them. */
-CMPIBroker handleOf(Broker& broker, const FunctionTables& tables) {
-    auto& plain = const_cast<FunctionTables&>(tables);
-    const bool hasMemory = broker.profile().gaps != BrokerGaps::memoryTable;
-    return {&broker, &plain.broker, &plain.encapsulation, &plain.threads, hasMemory ? &plain.memory : nullptr};
+/** CMPIBroker points to tables without const, although no caller writes to them. */
+CMPIBroker handleOf(Broker& broker, const BrokerOptions& options) {
+    auto& tables = const_cast<FunctionTables&>(*options.tables);
+    return {&broker, &tables.broker, &tables.encapsulation, &tables.threads,
+            options.hasMemoryTable ? &tables.memory : nullptr};
 }
 
 }  // namespace
 
+Response notSupported(Operation operation) {
+    return Response::failed(
+        {CMPI_RC_ERR_NOT_SUPPORTED, std::string(nameOf(operation)) + " is not supported by this object manager."});
+}
+
 Broker::Broker(BrokerOptions itsOptions)
-    : options(completed(std::move(itsOptions))), brokerHandle(handleOf(*this, *options.tables)), outside(tables()) {}
+    : options(completed(std::move(itsOptions))), brokerHandle(handleOf(*this, options)), outside(tables()) {}
 
 Broker::~Broker() = default;
 
@@ -59,16 +66,16 @@ Broker& Broker::of(const CMPIBroker* handle) {
     return *static_cast<Broker*>(handle->hdl);
 }
 
-std::shared_ptr<const ClassShape> Broker::classShape(const std::string& className) const {
-    return options.classShape ? options.classShape(className) : nullptr;
+std::shared_ptr<const ClassInfo> Broker::classInfo(const std::string& className) const {
+    return options.classInfo ? options.classInfo(className) : nullptr;
 }
 
 bool Broker::isA(const std::string& className, const std::string& ancestor) const {
     if (sameName(className, ancestor)) {
         return true;
     }
-    const auto shape = classShape(className);
-    return shape && std::any_of(shape->superclasses.begin(), shape->superclasses.end(),
+    const auto known = classInfo(className);
+    return known && std::any_of(known->superclasses.begin(), known->superclasses.end(),
                                 [&](const std::string& each) { return sameName(each, ancestor); });
 }
 

@@ -9,15 +9,15 @@
 #include <string>
 
 #include "broker/Arena.h"
-#include "broker/ClassShape.h"
+#include "broker/ClassInfo.h"
 #include "broker/FunctionTables.h"
 #include "broker/MemoryBlocks.h"
-#include "broker/Profile.h"
-#include "broker/UpCalls.h"
+#include "model/Request.h"
+#include "model/Response.h"
 
 namespace cimhost {
 
-/** A line that a provider gives the broker to log or to trace. */
+/** A line that a provider logs or traces through the broker. */
 struct LogRecord {
     bool isTrace = false;
     int level = 0;            ///< a CMPISeverity, or a CMPILevel of a trace
@@ -25,14 +25,29 @@ struct LogRecord {
     std::string text{};
 };
 
-/** What a broker works with. */
+/** Receives the requests that providers send to the object manager. */
+class UpCalls {
+public:
+    virtual ~UpCalls() = default;
+
+    /**
+     * Performs a request. Called on the thread of the provider that sends it, possibly concurrently and from inside
+     * another request; an exception becomes the status CMPI_RC_ERR_FAILED with its message.
+     */
+    virtual Response perform(Request request) = 0;
+};
+
+/** The response to an operation that an object manager does not have. */
+Response notSupported(Operation operation);
+
+/** What a broker is made with. */
 struct BrokerOptions {
-    ClassShapeLookup classShape{};                ///< none: no class is known
-    UpCalls* upCalls = nullptr;                   ///< not owned; null: no up-call is supported
-    std::function<void(const LogRecord&)> log{};  ///< none: log and trace records are dropped; may be called on
-                                                  ///< several threads at a time
-    const FunctionTables* tables = nullptr;       ///< not owned, gaps and all; null: those of the manager
-    Manager manager = Manager::standard;          ///< the object manager that it is the broker of
+    ClassInfoLookup classInfo{};  ///< none: no class is known
+    UpCalls* upCalls = nullptr;   ///< not owned; null: no up-call is supported
+    std::function<void(const LogRecord&)>
+        log{};                               ///< none: log and trace records are dropped; may be called concurrently
+    const FunctionTables* tables = nullptr;  ///< not owned; null: the standard tables
+    bool hasMemoryTable = true;              ///< whether the handle has a CMPIBrokerMemFT
 };
 
 /**
@@ -58,14 +73,8 @@ public:
     const FunctionTables& tables() const { return *options.tables; }
     UpCalls& upCalls() const { return *options.upCalls; }
 
-    /** How its object manager treats providers. */
-    const Profile& profile() const { return profileOf(options.manager); }
-
-    /** Is the broker of that manager from now on, its tables apart. Not while requests run. */
-    void play(Manager manager) { options.manager = manager; }
-
-    /** Shape of a class, or null when it is not known. */
-    std::shared_ptr<const ClassShape> classShape(const std::string& className) const;
+    /** The class of that name; null when it is not known. */
+    std::shared_ptr<const ClassInfo> classInfo(const std::string& className) const;
 
     /** Whether the class is the other one or is known to descend from it. */
     bool isA(const std::string& className, const std::string& ancestor) const;

@@ -5,7 +5,7 @@
 #include <tuple>
 #include <type_traits>
 
-#include "broker/Boundary.h"
+#include "broker/ErrorTranslation.h"
 
 namespace cimhost {
 namespace {
@@ -95,30 +95,30 @@ CMPIData nullData(CMPIType type) {
     return data;
 }
 
-CMPIData hollowData(bool isNull, Arena& arena) {
+/** A string object whose character pointer is null. */
+CMPIData dataWithoutCharacters(bool isNull, Arena& arena) {
     CMPIData data = nullData(CMPI_string);
     data.state = isNull ? CMPI_nullValue : CMPI_goodValue;
     data.value.string = arena.make<CMPIString>({});
-    objectOf(data.value.string)->isHollow = true;
+    objectOf(data.value.string)->lacksCharacters = true;
     return data;
 }
 
-/** Whether the value, of a type with objects, has none that means something. */
-bool isEmptyHanded(const CMPIValue& value, CMPIType type) {
-    const auto* text = type == CMPI_string ? objectOf(value.string) : nullptr;
-    return value.string == nullptr || (text != nullptr && text->isHollow);
+/** Whether a value of a type with objects has none, or a string without characters. */
+bool lacksObject(const CMPIValue& value, CMPIType type) {
+    const auto* string = type == CMPI_string ? objectOf(value.string) : nullptr;
+    return value.string == nullptr || (string != nullptr && string->lacksCharacters);
 }
 
 Value arrayFrom(const CMPIArray* array, CMPIType type) {
-    Value result{type, true, array == nullptr, {}};
-    if (array != nullptr) {
-        const ArrayContent& content = argument(array);
-        if (content.type != type) {
-            throw Failure(CMPI_RC_ERR_TYPE_MISMATCH);
-        }
-        result.elements = content.elements;
+    if (array == nullptr) {
+        return Value::nullArray(type);
     }
-    return result;
+    const ArrayContent& content = argument(array);
+    if (content.type != type) {
+        throw Failure(CMPI_RC_ERR_TYPE_MISMATCH);
+    }
+    return Value::array(type, content.elements);
 }
 
 }  // namespace
@@ -145,7 +145,7 @@ Scalar scalarFrom(const CMPIValue* value, CMPIType type) {
         return std::string(reinterpret_cast<const char*>(value));
     }
     if (isEncapsulated(type)) {
-        return isEmptyHanded(*value, type) ? Scalar{} : readEncapsulated(*value, type);
+        return lacksObject(*value, type) ? Scalar{} : readEncapsulated(*value, type);
     }
     Scalar scalar;
     const bool found = anyPlainType([&](const auto& each) {
@@ -168,10 +168,7 @@ Value valueFrom(const CMPIValue* value, CMPIType type) {
         return arrayFrom(value == nullptr ? nullptr : value->array, element);
     }
     Scalar scalar = scalarFrom(value, type);
-    if (std::holds_alternative<std::monostate>(scalar)) {
-        return {element, false, true, {}};
-    }
-    return {element, false, false, {std::move(scalar)}};
+    return Value::of(element, std::move(scalar));
 }
 
 CMPIData dataFrom(const Scalar& scalar, CMPIType type, Arena& arena) {
@@ -202,11 +199,31 @@ CMPIData dataFrom(const Value& value, Arena& arena) {
         }
         return data;
     }
-    if (isHollow(value)) {
-        return hollowData(value.isNull, arena);
+    if (value.isStringWithoutCharacters()) {
+        return dataWithoutCharacters(value.isNull, arena);
     }
     return value.isNull || value.elements.empty() ? nullData(value.type)
                                                   : dataFrom(value.elements.front(), value.type, arena);
+}
+
+PropertyList propertyListFrom(const char** names) {
+    if (names == nullptr) {
+        return std::nullopt;
+    }
+    std::vector<std::string> list;
+    for (; *names != nullptr; ++names) {
+        list.emplace_back(*names);
+    }
+    return list;
+}
+
+CPropertyList::CPropertyList(const PropertyList& list) {
+    if (list) {
+        for (const std::string& name : *list) {
+            pointers.push_back(name.c_str());
+        }
+        pointers.push_back(nullptr);
+    }
 }
 
 }  // namespace cimhost

@@ -2,7 +2,10 @@
 
 #include <cmpidt.h>
 
+#include <vector>
+
 #include "broker/Arena.h"
+#include "model/Request.h"
 #include "model/Value.h"
 
 namespace cimhost {
@@ -27,5 +30,20 @@ CMPIData dataFrom(const Value& value, Arena& arena);
 
 /** One element as CMPI data. */
 CMPIData dataFrom(const Scalar& scalar, CMPIType type, Arena& arena);
+
+/** Reads a property list in C: pointers to names, ended by a null pointer; a null list names all properties. */
+PropertyList propertyListFrom(const char** names);
+
+/** A property list in C. It points into the list that it was made from, which must outlive it. */
+class CPropertyList {
+public:
+    explicit CPropertyList(const PropertyList& list);
+
+    /** Null when the list names all properties. */
+    const char** get() { return pointers.empty() ? nullptr : pointers.data(); }
+
+private:
+    std::vector<const char*> pointers;
+};
 
 }  // namespace cimhost

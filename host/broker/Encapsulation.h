@@ -1,8 +1,8 @@
 #pragma once
 
 #include "broker/Arena.h"
-#include "broker/Boundary.h"
 #include "broker/Broker.h"
+#include "broker/ErrorTranslation.h"
 
 namespace cimhost {
 
@@ -32,7 +32,7 @@ Handle* cloneObject(const Handle* handle, CMPIStatus* rc) {
         Encapsulated<Handle>& original = self(handle);
         Handle* copy = original.arena().clones().template make<Handle>(*original.content);
         objectOf(copy)->isClone = true;
-        objectOf(copy)->isHollow = original.isHollow;
+        objectOf(copy)->lacksCharacters = original.lacksCharacters;
         return copy;
     });
 }

@@ -1,12 +1,12 @@
 #include <cstring>
 
-#include "broker/Boundary.h"
 #include "broker/Broker.h"
 #include "broker/Convert.h"
 #include "broker/DateTimes.h"
+#include "broker/ErrorTranslation.h"
+#include "broker/FunctionTables.h"
 #include "broker/Messages.h"
 #include "broker/NamedValues.h"
-#include "broker/Tables.h"
 #include "broker/ToText.h"
 #include "schema/Text.h"
 
@@ -21,9 +21,9 @@ Arena& arenaOf(const CMPIBroker* broker) {
 }
 
 /** The keys of the path that are properties of the class, with their values. */
-std::vector<NamedValue> keyProperties(const ObjectPath& path, const ClassShape& shape) {
+std::vector<NamedValue> keyProperties(const ObjectPath& path, const ClassInfo& classInfo) {
     std::vector<NamedValue> properties;
-    for (const PropertyShape& property : shape.properties) {
+    for (const PropertyInfo& property : classInfo.properties) {
         const NamedValue* key = property.isKey ? findNamed(path.keys, property.name) : nullptr;
         if (key != nullptr) {
             properties.push_back({property.name, key->value});
@@ -38,9 +38,9 @@ CMPIInstance* newInstance(const CMPIBroker* broker, const CMPIObjectPath* path, 
         Broker& owner = Broker::of(broker);
         InstanceContent content;
         content.value.path = argument(path);
-        content.shape = owner.classShape(content.value.path.className);
-        if (content.shape) {
-            content.value.properties = keyProperties(content.value.path, *content.shape);
+        content.classInfo = owner.classInfo(content.value.path.className);
+        if (content.classInfo) {
+            content.value.properties = keyProperties(content.value.path, *content.classInfo);
             content.given = content.value.properties.size();
         }
         return owner.arena().make<CMPIInstance>(std::move(content));

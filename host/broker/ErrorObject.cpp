@@ -1,5 +1,5 @@
 #include "broker/Encapsulation.h"
-#include "broker/Tables.h"
+#include "broker/FunctionTables.h"
 
 namespace cimhost {
 namespace {

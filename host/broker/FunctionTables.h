@@ -25,12 +25,30 @@ struct FunctionTables {
     CMPIErrorFT error;
 };
 
-enum class Manager;
-
 /** The tables of this host, with every function. They live as long as the program. */
 const FunctionTables& standardTables();
 
-/** The same as they look under an object manager. They live as long as the program. */
-const FunctionTables& tablesOf(Manager manager);
+// The single tables, each defined beside its functions.
+
+/** Version of the standard that the tables follow. */
+constexpr int tableVersion = CMPIVersion200;
+
+extern const CMPIBrokerFT brokerTable;
+extern const CMPIBrokerEncFT encapsulationTable;
+extern const CMPIBrokerExtFT threadTable;
+extern const CMPIBrokerMemFT memoryTable;
+extern const CMPIStringFT stringTable;
+extern const CMPIObjectPathFT objectPathTable;
+extern const CMPIInstanceFT instanceTable;
+extern const CMPIDateTimeFT dateTimeTable;
+extern const CMPIArrayFT arrayTable;
+extern const CMPIEnumerationFT enumerationTable;
+extern const CMPIArgsFT argsTable;
+extern const CMPIContextFT contextTable;
+extern const CMPIResultFT resultTable;
+extern const CMPIErrorFT errorTable;
+
+/** A setPropertyFilter for instances that also hides keys that are not listed. */
+CMPIStatus setPropertyFilterWithKeys(CMPIInstance* instance, const char** properties, const char** keys);
 
 }  // namespace cimhost

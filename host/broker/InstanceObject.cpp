@@ -2,23 +2,22 @@
 
 #include "broker/Convert.h"
 #include "broker/Encapsulation.h"
+#include "broker/FunctionTables.h"
 #include "broker/NamedValues.h"
-#include "broker/PropertyLists.h"
-#include "broker/Tables.h"
 #include "schema/Names.h"
 
 namespace cimhost {
 namespace {
 
-const PropertyShape* findProperty(const ClassShape& shape, const std::string& name) {
-    const auto found = std::find_if(shape.properties.begin(), shape.properties.end(),
-                                    [&](const PropertyShape& each) { return sameName(each.name, name); });
-    return found == shape.properties.end() ? nullptr : &*found;
+const PropertyInfo* findProperty(const ClassInfo& classInfo, const std::string& name) {
+    const auto found = std::find_if(classInfo.properties.begin(), classInfo.properties.end(),
+                                    [&](const PropertyInfo& each) { return sameName(each.name, name); });
+    return found == classInfo.properties.end() ? nullptr : &*found;
 }
 
 bool isKey(const InstanceContent& instance, const std::string& name) {
-    const PropertyShape* shape = instance.shape ? findProperty(*instance.shape, name) : nullptr;
-    return shape != nullptr ? shape->isKey : findNamed(instance.value.path.keys, name) != nullptr;
+    const PropertyInfo* classInfo = instance.classInfo ? findProperty(*instance.classInfo, name) : nullptr;
+    return classInfo != nullptr ? classInfo->isKey : findNamed(instance.value.path.keys, name) != nullptr;
 }
 
 /** Whether the property filter lets the property through. Keys usually pass: without them an instance is nameless. */
@@ -29,17 +28,17 @@ bool accepts(const InstanceContent& instance, const std::string& name) {
 }
 
 /** Failure when the class is known and has no such property, or has it with another type. */
-void checkAgainstClass(const ClassShape* shape, const std::string& name, const Value& value) {
-    if (shape == nullptr) {
+void checkAgainstClass(const ClassInfo* classInfo, const std::string& name, const Value& value) {
+    if (classInfo == nullptr) {
         return;
     }
-    const PropertyShape* property = findProperty(*shape, name);
+    const PropertyInfo* property = findProperty(*classInfo, name);
     if (property == nullptr) {
-        throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY, shape->name + " has no property " + name + ".");
+        throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY, classInfo->name + " has no property " + name + ".");
     }
     const bool isUntypedNull = value.isNull && value.type == CMPI_null;
     if (!isUntypedNull && (value.type != property->type || value.isArray != property->isArray)) {
-        throw Failure(CMPI_RC_ERR_TYPE_MISMATCH, shape->name + "." + name + " has another type.");
+        throw Failure(CMPI_RC_ERR_TYPE_MISMATCH, classInfo->name + "." + name + " has another type.");
     }
 }
 
@@ -63,7 +62,7 @@ CMPIStatus setProperty(const CMPIInstance* instance, const char* name, const CMP
             throw Failure(CMPI_RC_ERR_INVALID_PARAMETER);
         }
         Value converted = valueFrom(value, type);
-        checkAgainstClass(target.shape.get(), property, converted);
+        checkAgainstClass(target.classInfo.get(), property, converted);
         if (accepts(target, property)) {
             withdrawGiven(target, property);
             setNamed(target.value.properties, property, std::move(converted));
@@ -138,7 +137,7 @@ CMPIStatus setPropertyFilter(CMPIInstance* instance, const char** properties, co
 
 }  // namespace
 
-CMPIStatus filterWithKeys(CMPIInstance* instance, const char** properties, const char**) {
+CMPIStatus setPropertyFilterWithKeys(CMPIInstance* instance, const char** properties, const char**) {
     return filter(instance, properties, true);
 }
 

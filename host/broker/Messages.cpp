@@ -3,8 +3,8 @@
 #include <string>
 #include <vector>
 
-#include "broker/Boundary.h"
 #include "broker/Broker.h"
+#include "broker/ErrorTranslation.h"
 
 namespace cimhost {
 namespace {

@@ -2,8 +2,8 @@
 
 #include <algorithm>
 
-#include "broker/Boundary.h"
 #include "broker/Convert.h"
+#include "broker/ErrorTranslation.h"
 #include "schema/Names.h"
 
 namespace cimhost {

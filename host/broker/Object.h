@@ -4,7 +4,7 @@
 #include <optional>
 #include <utility>
 
-#include "broker/Contents.h"
+#include "broker/ObjectContents.h"
 
 namespace cimhost {
 
@@ -25,8 +25,8 @@ public:
     /** Clones live until somebody releases them: they outlive requests and marks. */
     bool isClone = false;
 
-    /** A string without characters, not even the empty ones, as some object managers have them. */
-    bool isHollow = false;
+    /** A string object whose character pointer is null, which some object managers pass. */
+    bool lacksCharacters = false;
 
     /** Becomes true when the object is released or goes; may be null. */
     std::shared_ptr<bool> released{};

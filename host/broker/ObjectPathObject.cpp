@@ -1,7 +1,7 @@
 #include "broker/Convert.h"
 #include "broker/Encapsulation.h"
+#include "broker/FunctionTables.h"
 #include "broker/NamedValues.h"
-#include "broker/Tables.h"
 #include "schema/ObjectPathText.h"
 
 namespace cimhost {

@@ -21,7 +21,7 @@ CMPIObjectPath* RequestScope::objectPath(const ObjectPath& path) {
 }
 
 CMPIInstance* RequestScope::instance(const Instance& instance) {
-    return objects.make<CMPIInstance>({instance, broker.classShape(instance.path.className), {}});
+    return objects.make<CMPIInstance>({instance, broker.classInfo(instance.path.className), {}});
 }
 
 CMPIResult* RequestScope::result(ResultEvents& events, const ResultRules& rules) {

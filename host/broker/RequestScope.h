@@ -1,7 +1,7 @@
 #pragma once
 
 #include "broker/Broker.h"
-#include "broker/Contents.h"
+#include "broker/ObjectContents.h"
 #include "model/ResultEvent.h"
 #include "model/Value.h"
 

@@ -1,6 +1,6 @@
 #include "broker/Convert.h"
 #include "broker/Encapsulation.h"
-#include "broker/Tables.h"
+#include "broker/FunctionTables.h"
 
 namespace cimhost {
 namespace {

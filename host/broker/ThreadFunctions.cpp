@@ -8,7 +8,7 @@
 #include <string>
 #include <type_traits>
 
-#include "broker/Tables.h"
+#include "broker/FunctionTables.h"
 
 // CMPIBrokerExtFT: threads, mutexes and conditions of POSIX, by handles that the provider owns.
 

@@ -1,6 +1,6 @@
 #include "broker/ToText.h"
 
-#include "broker/Boundary.h"
+#include "broker/ErrorTranslation.h"
 #include "schema/MofWriter.h"
 #include "schema/ObjectPathText.h"
 

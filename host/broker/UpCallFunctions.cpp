@@ -1,27 +1,12 @@
-#include "broker/Boundary.h"
 #include "broker/Broker.h"
 #include "broker/Convert.h"
-#include "broker/PropertyLists.h"
-#include "broker/Tables.h"
+#include "broker/ErrorTranslation.h"
+#include "broker/FunctionTables.h"
 
-// CMPIBrokerFT: what providers ask the object manager for. Each function hands plain values to UpCalls.
+// CMPIBrokerFT: what providers ask the object manager for. Each function makes a Request for UpCalls.
 
 namespace cimhost {
 namespace {
-
-template <class T>
-T taken(Answer<T> answer) {
-    if (!answer.ok()) {
-        throw Failure(std::move(answer.status));
-    }
-    return std::move(answer.value);
-}
-
-void require(const Status& status) {
-    if (!status.ok()) {
-        throw Failure(status);
-    }
-}
 
 /** The entries of the caller's context; none for a caller that has no context. */
 const ContextEntries& entriesOf(const CMPIContext* context) {
@@ -29,15 +14,23 @@ const ContextEntries& entriesOf(const CMPIContext* context) {
     return context == nullptr ? none : argument(context).entries;
 }
 
-std::optional<std::string> textIfAny(const char* text) {
-    return text == nullptr ? std::nullopt : std::optional<std::string>(text);
+std::optional<std::string> optionalName(const char* name) {
+    return name == nullptr ? std::nullopt : std::optional<std::string>(name);
+}
+
+/** Performs the request in the caller's context. Failure with the status of the response if it is not OK. */
+Response performed(const CMPIBroker* broker, const CMPIContext* context, Request request) {
+    request.context = entriesOf(context);
+    Response response = Broker::of(broker).upCalls().perform(std::move(request));
+    if (!response.ok()) {
+        throw Failure(std::move(response.status));
+    }
+    return response;
 }
 
 template <class Kind>
 CMPIEnumeration* enumerationOf(Broker& broker, CMPIType type, std::vector<Kind> values) {
-    const bool isMarkedNull = broker.profile().marksElementsNull;
-    EnumerationContent content{
-        type, {}, 0, static_cast<CMPIValueState>(isMarkedNull ? CMPI_nullValue : CMPI_goodValue)};
+    EnumerationContent content{type, {}, 0};
     content.elements.reserve(values.size());
     for (Kind& value : values) {
         content.elements.emplace_back(std::make_shared<const Kind>(std::move(value)));
@@ -45,12 +38,27 @@ CMPIEnumeration* enumerationOf(Broker& broker, CMPIType type, std::vector<Kind> 
     return broker.arena().make<CMPIEnumeration>(std::move(content));
 }
 
-CMPIEnumeration* enumerationOf(Broker& broker, Answer<std::vector<Instance>> answer) {
-    return enumerationOf(broker, CMPI_instance, taken(std::move(answer)));
+/** Performs a request that makeRequest() returns; its results, instances or paths, become an enumeration. */
+template <class MakeRequest>
+CMPIEnumeration* enumerated(const CMPIBroker* handle, const CMPIContext* context, CMPIStatus* rc,
+                            MakeRequest makeRequest) {
+    return guarded<CMPIEnumeration*>(rc, nullptr, [&] {
+        Broker& broker = Broker::of(handle);
+        Request request = makeRequest();
+        const bool arePaths = returnsPaths(request.operation);
+        Response response = performed(handle, context, std::move(request));
+        return arePaths ? enumerationOf(broker, CMPI_ref, std::move(response.paths))
+                        : enumerationOf(broker, CMPI_instance, std::move(response.instances));
+    });
 }
 
-CMPIEnumeration* enumerationOf(Broker& broker, Answer<std::vector<ObjectPath>> answer) {
-    return enumerationOf(broker, CMPI_ref, taken(std::move(answer)));
+/** The only result of a response. Failure with CMPI_RC_ERR_FAILED if there is none. */
+template <class Kind>
+Kind onlyOne(std::vector<Kind>& results) {
+    if (results.empty()) {
+        throw Failure(CMPI_RC_ERR_FAILED, "The object manager returned no result.");
+    }
+    return std::move(results.front());
 }
 
 CMPIContext* prepareAttachThread(const CMPIBroker* handle, const CMPIContext* context) {
@@ -83,28 +91,22 @@ CMPIStatus deliverIndication(const CMPIBroker* handle, const CMPIContext*, const
 
 CMPIEnumeration* enumerateInstanceNames(const CMPIBroker* handle, const CMPIContext* context,
                                         const CMPIObjectPath* path, CMPIStatus* rc) {
-    return guarded<CMPIEnumeration*>(rc, nullptr, [&] {
-        Broker& broker = Broker::of(handle);
-        return enumerationOf(broker, broker.upCalls().enumerateInstanceNames(entriesOf(context), argument(path)));
-    });
+    return enumerated(handle, context, rc, [&] { return Request::enumerateInstanceNames(argument(path)); });
 }
 
 CMPIEnumeration* enumerateInstances(const CMPIBroker* handle, const CMPIContext* context, const CMPIObjectPath* path,
                                     const char** properties, CMPIStatus* rc) {
-    return guarded<CMPIEnumeration*>(rc, nullptr, [&] {
-        Broker& broker = Broker::of(handle);
-        return enumerationOf(broker, broker.upCalls().enumerateInstances(entriesOf(context), argument(path),
-                                                                         propertyListFrom(properties)));
-    });
+    return enumerated(handle, context, rc,
+                      [&] { return Request::enumerateInstances(argument(path), propertyListFrom(properties)); });
 }
 
 CMPIInstance* getInstance(const CMPIBroker* handle, const CMPIContext* context, const CMPIObjectPath* path,
                           const char** properties, CMPIStatus* rc) {
     return guarded<CMPIInstance*>(rc, nullptr, [&] {
         Broker& broker = Broker::of(handle);
-        Instance instance =
-            taken(broker.upCalls().getInstance(entriesOf(context), argument(path), propertyListFrom(properties)));
-        return broker.arena().make<CMPIInstance>({std::move(instance), nullptr, {}});
+        Response response =
+            performed(handle, context, Request::getInstance(argument(path), propertyListFrom(properties)));
+        return broker.arena().make<CMPIInstance>({onlyOne(response.instances), nullptr, {}});
     });
 }
 
@@ -112,71 +114,62 @@ CMPIObjectPath* createInstance(const CMPIBroker* handle, const CMPIContext* cont
                                const CMPIInstance* instance, CMPIStatus* rc) {
     return guarded<CMPIObjectPath*>(rc, nullptr, [&] {
         Broker& broker = Broker::of(handle);
-        return broker.arena().make<CMPIObjectPath>(
-            taken(broker.upCalls().createInstance(entriesOf(context), argument(path), argument(instance).value)));
+        Response response =
+            performed(handle, context, Request::createInstance(argument(path), argument(instance).value));
+        return broker.arena().make<CMPIObjectPath>(onlyOne(response.paths));
     });
 }
 
 CMPIStatus modifyInstance(const CMPIBroker* handle, const CMPIContext* context, const CMPIObjectPath* path,
                           const CMPIInstance* instance, const char** properties) {
     return guarded([&] {
-        require(Broker::of(handle).upCalls().modifyInstance(entriesOf(context), argument(path),
-                                                            argument(instance).value, propertyListFrom(properties)));
+        performed(handle, context,
+                  Request::modifyInstance(argument(path), argument(instance).value, propertyListFrom(properties)));
     });
 }
 
 CMPIStatus deleteInstance(const CMPIBroker* handle, const CMPIContext* context, const CMPIObjectPath* path) {
-    return guarded([&] { require(Broker::of(handle).upCalls().deleteInstance(entriesOf(context), argument(path))); });
+    return guarded([&] { performed(handle, context, Request::deleteInstance(argument(path))); });
 }
 
 CMPIEnumeration* execQuery(const CMPIBroker* handle, const CMPIContext* context, const CMPIObjectPath* path,
                            const char* query, const char* language, CMPIStatus* rc) {
-    return guarded<CMPIEnumeration*>(rc, nullptr, [&] {
-        Broker& broker = Broker::of(handle);
-        return enumerationOf(broker, broker.upCalls().execQuery(entriesOf(context), argument(path), argument(query),
-                                                                argument(language)));
-    });
+    return enumerated(handle, context, rc,
+                      [&] { return Request::execQuery(argument(path), argument(language), argument(query)); });
 }
 
 CMPIEnumeration* associators(const CMPIBroker* handle, const CMPIContext* context, const CMPIObjectPath* path,
                              const char* associationClass, const char* resultClass, const char* role,
                              const char* resultRole, const char** properties, CMPIStatus* rc) {
-    return guarded<CMPIEnumeration*>(rc, nullptr, [&] {
-        Broker& broker = Broker::of(handle);
-        const AssociationFilter filter{textIfAny(associationClass), textIfAny(resultClass), textIfAny(role),
-                                       textIfAny(resultRole)};
-        return enumerationOf(broker, broker.upCalls().associators(entriesOf(context), argument(path), filter,
-                                                                  propertyListFrom(properties)));
+    return enumerated(handle, context, rc, [&] {
+        return Request::associators(
+            argument(path),
+            {optionalName(associationClass), optionalName(resultClass), optionalName(role), optionalName(resultRole)},
+            propertyListFrom(properties));
     });
 }
 
 CMPIEnumeration* associatorNames(const CMPIBroker* handle, const CMPIContext* context, const CMPIObjectPath* path,
                                  const char* associationClass, const char* resultClass, const char* role,
                                  const char* resultRole, CMPIStatus* rc) {
-    return guarded<CMPIEnumeration*>(rc, nullptr, [&] {
-        Broker& broker = Broker::of(handle);
-        const AssociationFilter filter{textIfAny(associationClass), textIfAny(resultClass), textIfAny(role),
-                                       textIfAny(resultRole)};
-        return enumerationOf(broker, broker.upCalls().associatorNames(entriesOf(context), argument(path), filter));
+    return enumerated(handle, context, rc, [&] {
+        return Request::associatorNames(argument(path), {optionalName(associationClass), optionalName(resultClass),
+                                                         optionalName(role), optionalName(resultRole)});
     });
 }
 
 CMPIEnumeration* references(const CMPIBroker* handle, const CMPIContext* context, const CMPIObjectPath* path,
                             const char* resultClass, const char* role, const char** properties, CMPIStatus* rc) {
-    return guarded<CMPIEnumeration*>(rc, nullptr, [&] {
-        Broker& broker = Broker::of(handle);
-        const AssociationFilter filter{{}, textIfAny(resultClass), textIfAny(role), {}};
-        return enumerationOf(broker, broker.upCalls().references(entriesOf(context), argument(path), filter,
-                                                                 propertyListFrom(properties)));
+    return enumerated(handle, context, rc, [&] {
+        return Request::references(argument(path), {{}, optionalName(resultClass), optionalName(role), {}},
+                                   propertyListFrom(properties));
     });
 }
 
 CMPIEnumeration* referenceNames(const CMPIBroker* handle, const CMPIContext* context, const CMPIObjectPath* path,
                                 const char* resultClass, const char* role, CMPIStatus* rc) {
-    return guarded<CMPIEnumeration*>(rc, nullptr, [&] {
-        Broker& broker = Broker::of(handle);
-        const AssociationFilter filter{{}, textIfAny(resultClass), textIfAny(role), {}};
-        return enumerationOf(broker, broker.upCalls().referenceNames(entriesOf(context), argument(path), filter));
+    return enumerated(handle, context, rc, [&] {
+        return Request::referenceNames(argument(path), {{}, optionalName(resultClass), optionalName(role), {}});
     });
 }
 
@@ -185,22 +178,20 @@ CMPIData invokeMethod(const CMPIBroker* handle, const CMPIContext* context, cons
     return guarded(rc, badData(), [&] {
         Broker& broker = Broker::of(handle);
         static const std::vector<NamedValue> none;
-        std::vector<NamedValue> returned;
-        const Value value =
-            taken(broker.upCalls().invokeMethod(entriesOf(context), argument(path), argument(method),
-                                                input == nullptr ? none : argument(input).values, returned));
+        const auto& parameters = input == nullptr ? none : argument(input).values;
+        Response response =
+            performed(handle, context, Request::invokeMethod(argument(path), argument(method), parameters));
         if (output != nullptr) {
-            argument(output).values = std::move(returned);
+            argument(output).values = std::move(response.output);
         }
-        return dataFrom(value, broker.arena());
+        return dataFrom(response.value, broker.arena());
     });
 }
 
 CMPIStatus setProperty(const CMPIBroker* handle, const CMPIContext* context, const CMPIObjectPath* path,
                        const char* name, const CMPIValue* value, CMPIType type) {
     return guarded([&] {
-        require(Broker::of(handle).upCalls().setProperty(entriesOf(context), argument(path), argument(name),
-                                                         valueFrom(value, type)));
+        performed(handle, context, Request::setProperty(argument(path), argument(name), valueFrom(value, type)));
     });
 }
 
@@ -208,8 +199,8 @@ CMPIData getProperty(const CMPIBroker* handle, const CMPIContext* context, const
                      CMPIStatus* rc) {
     return guarded(rc, badData(), [&] {
         Broker& broker = Broker::of(handle);
-        const Value value = taken(broker.upCalls().getProperty(entriesOf(context), argument(path), argument(name)));
-        return dataFrom(value, broker.arena());
+        const Response response = performed(handle, context, Request::getProperty(argument(path), argument(name)));
+        return dataFrom(response.value, broker.arena());
     });
 }
 

@@ -1,12 +1,11 @@
 #include "cli/Arguments.h"
 
 #include <CLI/CLI.hpp>
-#include <map>
 #include <sstream>
 
 #include "Installation.h"
+#include "cli/Choice.h"
 #include "cli/ExitStatus.h"
-#include "cli/LoadArguments.h"
 #include "cli/Suggestion.h"
 
 namespace cimhost {
@@ -16,7 +15,7 @@ constexpr auto introduction =
     "Runs requests on CMPI providers without an installed object manager.\n"
     "Providers come from registration files in SFCB's form, classes from MOF files.";
 
-constexpr auto closing =
+constexpr auto examples =
     R"(Object paths are WBEM URIs: [namespace:]Class[.Key=value,...]. String keys stand in quotation marks, which
 a shell keeps only inside of quotes:
 
@@ -26,12 +25,10 @@ a shell keeps only inside of quotes:
   cimhost ai 'root/cimv2:Some_System.Name="host"' --assoc-class Some_Association
   cimhost --format json ein Some_Class
   cimhost --schema my.mof --registration my.reg --library-path build/lib ei My_Class
-  cimhost --as sfcb ci 'Some_Class.InstanceID="2"'
-  cimhost --as pegasus load Some_Class --clients 32 --requests 100000
+)";
 
-With --as, the providers meet the behaviour of another object manager. What would end its provider process is reported
-as an error.
-
+constexpr auto closing =
+    R"(
 Environment: CIMHOST_SCHEMA, CIMHOST_REGISTRATION and CIMHOST_LIBRARY_PATH hold files or directories, separated
 by colons, for what the options do not name.
 
@@ -40,71 +37,49 @@ schema cannot be loaded, 4 the output cannot be written.)";
 
 enum class Target { none, className, objectPath };
 
+/** Options of a command; they can be combined. */
+enum CommandOptions : unsigned {
+    plain = 0,
+    assigns = 1,     ///< NAME=VALUE, --null
+    associates = 2,  ///< --assoc-class, --result-role
+    refers = 4,      ///< --result-class, --role
+    lists = 8        ///< --property
+};
+
 struct Command {
     std::optional<Operation> operation;
     const char* name;
     const char* shortName;  ///< null: none
     const char* description;
     Target target;
-    bool assigns;     ///< takes NAME=VALUE
-    bool associates;  ///< takes --assoc-class, --result-role
-    bool refers;      ///< takes --result-class, --role
-    bool lists;       ///< takes --property
+    unsigned options;
     const char* example;
 };
 
 constexpr Command commands[] = {
     {Operation::enumerateInstances, "enumerate-instances", "ei", "List the instances of a class", Target::className,
-     false, false, false, true, "cimhost ei Some_Class --property Size"},
+     lists, "cimhost ei Some_Class --property Size"},
     {Operation::enumerateInstanceNames, "enumerate-instance-names", "ein", "List the paths of a class's instances",
-     Target::className, false, false, false, false, "cimhost --format json ein Some_Class"},
-    {Operation::getInstance, "get-instance", "gi", "Show an instance", Target::objectPath, false, false, false, true,
+     Target::className, plain, "cimhost --format json ein Some_Class"},
+    {Operation::getInstance, "get-instance", "gi", "Show an instance", Target::objectPath, lists,
      "cimhost gi 'Some_Class.InstanceID=\"1\"'"},
     {Operation::createInstance, "create-instance", "ci", "Create an instance and show its path", Target::objectPath,
-     true, false, false, false, "cimhost ci 'Some_Class.InstanceID=\"1\"' ElementName='a name' Size=5"},
-    {Operation::modifyInstance, "modify-instance", "mi", "Set properties of an instance", Target::objectPath, true,
-     false, false, false, "cimhost mi 'Some_Class.InstanceID=\"1\"' Size=6 --null ElementName"},
-    {Operation::deleteInstance, "delete-instance", "di", "Delete an instance", Target::objectPath, false, false, false,
-     false, "cimhost di 'Some_Class.InstanceID=\"1\"'"},
+     assigns, "cimhost ci 'Some_Class.InstanceID=\"1\"' ElementName='a name' Size=5"},
+    {Operation::modifyInstance, "modify-instance", "mi", "Set properties of an instance", Target::objectPath, assigns,
+     "cimhost mi 'Some_Class.InstanceID=\"1\"' Size=6 --null ElementName"},
+    {Operation::deleteInstance, "delete-instance", "di", "Delete an instance", Target::objectPath, plain,
+     "cimhost di 'Some_Class.InstanceID=\"1\"'"},
     {Operation::associators, "associators", "ai", "List the instances associated with an instance", Target::objectPath,
-     false, true, true, true, "cimhost ai 'Some_System.Name=\"host\"' --assoc-class Some_Association"},
+     associates | refers | lists, "cimhost ai 'Some_System.Name=\"host\"' --assoc-class Some_Association"},
     {Operation::associatorNames, "associator-names", "ain", "List the paths of the instances associated with one",
-     Target::objectPath, false, true, true, false, "cimhost ain 'Some_System.Name=\"host\"' --result-class Some_Class"},
+     Target::objectPath, associates | refers, "cimhost ain 'Some_System.Name=\"host\"' --result-class Some_Class"},
     {Operation::references, "references", "ri", "List the associations that refer to an instance", Target::objectPath,
-     false, false, true, true, "cimhost ri 'Some_System.Name=\"host\"' --result-class Some_Association"},
+     refers | lists, "cimhost ri 'Some_System.Name=\"host\"' --result-class Some_Association"},
     {Operation::referenceNames, "reference-names", "rin", "List the paths of the associations that refer to one",
-     Target::objectPath, false, false, true, false, "cimhost rin 'Some_System.Name=\"host\"'"},
-    {std::nullopt, "classes", nullptr, "List the classes and the providers that serve them", Target::none, false, false,
-     false, false, "cimhost --schema my.mof classes"},
+     Target::objectPath, refers, "cimhost rin 'Some_System.Name=\"host\"'"},
+    {std::nullopt, "classes", nullptr, "List the classes and the providers that serve them", Target::none, plain,
+     "cimhost --schema my.mof classes"},
 };
-
-Format formatNamed(const std::string& word) {
-    const std::map<std::string, Format> formats = {
-        {"text", Format::text}, {"json", Format::json}, {"mof", Format::mof}};
-    const auto found = formats.find(word);
-    if (found == formats.end()) {
-        throw CLI::ValidationError("--format", word + " is not one of text, json and mof");
-    }
-    return found->second;
-}
-
-Manager managerCalled(const std::string& word) {
-    const std::optional<Manager> manager = managerNamed(word);
-    if (!manager) {
-        throw CLI::ValidationError("--as", word + " is not one of standard, sfcb, pegasus and pegasus-empty-key");
-    }
-    return *manager;
-}
-
-text::Colours coloursCalled(const std::string& word) {
-    const std::map<std::string, text::Colours> wishes = {
-        {"auto", text::Colours::automatic}, {"always", text::Colours::always}, {"never", text::Colours::never}};
-    const auto found = wishes.find(word);
-    if (found == wishes.end()) {
-        throw CLI::ValidationError("--color", word + " is not one of auto, always and never");
-    }
-    return found->second;
-}
 
 void addCommonOptions(CLI::App& app, Arguments& arguments) {
     app.add_option("--schema", arguments.schemas, "MOF file with classes, or a directory of them (repeatable)")
@@ -120,16 +95,12 @@ void addCommonOptions(CLI::App& app, Arguments& arguments) {
     app.add_option("--namespace", arguments.nameSpace, "Namespace of paths that name none")
         ->type_name("NAME")
         ->capture_default_str();
-    const auto setFormat = [&arguments](const std::string& word) { arguments.format = formatNamed(word); };
-    app.add_option_function<std::string>("--format", setFormat, "Form of the output: text (default), json or mof")
+    addChoice<Format>(app, "--format", "Form of the output: text (default), json or mof", arguments.format,
+                      {{"text", Format::text}, {"json", Format::json}, {"mof", Format::mof}})
         ->type_name("FORM");
-    const auto setManager = [&arguments](const std::string& word) { arguments.manager = managerCalled(word); };
-    app.add_option_function<std::string>(
-           "--as", setManager, "Object manager to behave like: standard (default), sfcb, pegasus or pegasus-empty-key")
-        ->type_name("MANAGER");
-    const auto setColours = [&arguments](const std::string& word) { arguments.colours = coloursCalled(word); };
-    app.add_option_function<std::string>("--color", setColours,
-                                         "Colours in text: auto (default: on a terminal), always or never")
+    addChoice<text::Colours>(
+        app, "--color", "Colours in text: auto (default: on a terminal), always or never", arguments.colours,
+        {{"auto", text::Colours::automatic}, {"always", text::Colours::always}, {"never", text::Colours::never}})
         ->type_name("WHEN");
     app.add_flag("--raw", arguments.raw,
                  "Show exactly what the provider did: its status, each object it returned, its calls of returnDone");
@@ -138,8 +109,8 @@ void addCommonOptions(CLI::App& app, Arguments& arguments) {
 void addCommand(CLI::App& app, const Command& command, Arguments& arguments) {
     CLI::App* sub = app.add_subcommand(command.name, command.description);
     sub->fallthrough();
-    sub->footer(std::string("Example:\n\n  ") + command.example +
-                "\n\nSee cimhost --help for options of all commands and for more examples.");
+    sub->footer(std::string("Example:\n\n  ") + command.example + "\n\nSee " + app.get_name() +
+                " --help for options of all commands and for more examples.");
     if (command.shortName != nullptr) {
         sub->alias(command.shortName);
     }
@@ -148,22 +119,22 @@ void addCommand(CLI::App& app, const Command& command, Arguments& arguments) {
     } else if (command.target == Target::objectPath) {
         sub->add_option("PATH", arguments.target, "Object path, [namespace:]Class.Key=value,...")->required();
     }
-    if (command.assigns) {
+    if ((command.options & assigns) != 0) {
         sub->add_option("NAME=VALUE", arguments.assignments, "Value for a property; NAME= is the empty string");
         sub->add_option("--null", arguments.nulls, "Set this property to null (repeatable)")
             ->type_name("NAME")
             ->allow_extra_args(false);
     }
-    if (command.associates) {
+    if ((command.options & associates) != 0) {
         sub->add_option("--assoc-class", arguments.filter.associationClass, "Association to follow")
             ->type_name("CLASS");
         sub->add_option("--result-role", arguments.filter.resultRole, "Role of the other instance")->type_name("NAME");
     }
-    if (command.refers) {
+    if ((command.options & refers) != 0) {
         sub->add_option("--result-class", arguments.filter.resultClass, "Class of the results")->type_name("CLASS");
         sub->add_option("--role", arguments.filter.role, "Role of the instance given")->type_name("NAME");
     }
-    if (command.lists) {
+    if ((command.options & lists) != 0) {
         sub->add_option("--property", arguments.properties, "Ask for this property only (repeatable)")
             ->type_name("NAME")
             ->allow_extra_args(false);
@@ -171,7 +142,7 @@ void addCommand(CLI::App& app, const Command& command, Arguments& arguments) {
     sub->callback([&arguments, &command] { arguments.operation = command.operation; });
 }
 
-/** All that could stand where a word does that is not known: names of commands, and options. */
+/** All known names of commands and options. */
 std::vector<std::string> wordsOf(const CLI::App& app) {
     std::vector<std::string> words;
     for (const CLI::App* command : app.get_subcommands([](const CLI::App*) { return true; })) {
@@ -185,15 +156,16 @@ std::vector<std::string> wordsOf(const CLI::App& app) {
     return words;
 }
 
-/** What is wrong with words that neither a command nor an option takes, and what was perhaps meant. */
+/** The message for a word that is neither a command nor an option, with the nearest one that is. */
 std::string unknownText(const CLI::App& app, const std::string& word) {
     const std::vector<CLI::App*> used = app.get_subcommands();
     const std::string command = used.empty() ? "" : used.front()->get_name() + " ";
     const std::string what = used.empty() ? "there is no command or option " + word : command + "takes no " + word;
-    return what + didYouMean(word, wordsOf(app)) + "\nRun cimhost " + command + "--help for what there is.";
+    return what + didYouMean(word, wordsOf(app)) + "\nRun " + app.get_name() + " " + command +
+           "--help for what there is.";
 }
 
-/** Ends the program with what help, version or the mistake have to say. */
+/** Fills in the output of a program that ends with its help, its version or a usage error. */
 void end(ParsedArguments& parsed, const CLI::App& app, const CLI::ParseError& error) {
     std::ostringstream output;
     std::ostringstream problem;
@@ -211,17 +183,19 @@ void end(ParsedArguments& parsed, const CLI::App& app, const CLI::ParseError& er
 
 }  // namespace
 
-ParsedArguments parseArguments(int count, const char* const* values) {
+ParsedArguments parseArguments(int count, const char* const* values, const CommandLineExtension& extension) {
     ParsedArguments parsed;
-    CLI::App app(introduction, "cimhost");
-    app.footer(closing);
-    app.set_version_flag("--version", std::string("cimhost ") + installation::version);
+    CLI::App app(extension.introduction.empty() ? introduction : extension.introduction, extension.program);
+    app.footer(examples + extension.examples + (extension.notes.empty() ? "" : "\n" + extension.notes) + closing);
+    app.set_version_flag("--version", extension.program + " " + installation::version);
     app.require_subcommand(1);
     addCommonOptions(app, parsed.arguments);
     for (const Command& command : commands) {
         addCommand(app, command, parsed.arguments);
     }
-    addLoadCommand(app, parsed.arguments);
+    if (extension.addTo) {
+        extension.addTo(app);
+    }
     try {
         app.parse(count, values);
     } catch (const CLI::ParseError& error) {

@@ -1,37 +1,33 @@
 #pragma once
 
-#include <cstdint>
+#include <functional>
 #include <optional>
 #include <string>
 #include <vector>
 
-#include "cli/Style.h"
-#include "operations/Request.h"
+#include "cli/TextLayout.h"
+#include "model/Request.h"
+
+namespace CLI {
+class App;
+}
 
 namespace cimhost {
 
 enum class Format { text, json, mof };
 
-/** What the command load was given. */
-struct LoadArguments {
-    std::vector<std::string> classes{};
-    unsigned clients = 8;
-    std::size_t requests = 10'000;
-    std::uint64_t seed = 1;
-    std::string mix{};     ///< empty: the usual one
-    std::string source{};  ///< object path; empty: none
-    std::optional<std::string> associationClass{};
-    bool fills = false;
-    bool keeps = false;
-    bool isTrusting = false;
-    std::string shown{};  ///< a number or "all"; empty: what suits the form of the output
+/** What a program adds to the command line of cimhost; cimhost itself adds nothing. */
+struct CommandLineExtension {
+    std::string program = "cimhost";
+    std::string introduction{};              ///< first paragraph of the help; empty: that of cimhost
+    std::string examples{};                  ///< further lines of examples, each ending with a line feed
+    std::string notes{};                     ///< a paragraph after the examples, ending with a line feed; empty: none
+    std::function<void(CLI::App&)> addTo{};  ///< adds options and commands; may be empty
 };
 
-/** The command line, as it was given. */
+/** The command line. */
 struct Arguments {
-    std::optional<Operation> operation{};  ///< none: list the classes, or run a load
-    bool isLoad = false;
-    LoadArguments load{};
+    std::optional<Operation> operation{};    ///< none: list the classes, or a command of the extension
     std::string target{};                    ///< class name or object path; empty for classes
     std::vector<std::string> assignments{};  ///< NAME=VALUE
     std::vector<std::string> nulls{};        ///< properties to set to null
@@ -43,20 +39,19 @@ struct Arguments {
     std::string nameSpace = "root/cimv2";
     Format format = Format::text;
     bool raw = false;
-    Manager manager = Manager::standard;
     text::Colours colours = text::Colours::automatic;
     text::Style style{};  ///< for people, on standard output
 };
 
-/** What became of reading a command line: arguments to act on, or an end with something to say. */
+/** The result of reading a command line: arguments, or output and exit status of a program that ends at once. */
 struct ParsedArguments {
     Arguments arguments{};
-    bool ended = false;    ///< help or version was asked for, or the command line is wrong
+    bool ended = false;    ///< for --help and --version, and if the command line is wrong
     int exitStatus = 0;    ///< when ended
     std::string output{};  ///< for standard output, when ended
     std::string error{};   ///< for standard error, when ended
 };
 
-ParsedArguments parseArguments(int count, const char* const* values);
+ParsedArguments parseArguments(int count, const char* const* values, const CommandLineExtension& extension);
 
 }  // namespace cimhost

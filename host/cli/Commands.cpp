@@ -1,44 +1,38 @@
 #include "cli/Commands.h"
 
-#include "cli/ClassList.h"
+#include <algorithm>
+
 #include "cli/ExitStatus.h"
-#include "cli/JsonOutput.h"
-#include "cli/LoadCommand.h"
-#include "cli/Locations.h"
+#include "cli/Output.h"
 #include "cli/RequestBuilder.h"
+#include "cli/SearchPaths.h"
 #include "cli/Suggestion.h"
-#include "cli/TextOutput.h"
-#include "operations/ClassShapes.h"
-#include "operations/Interpretation.h"
-#include "operations/ObjectManager.h"
 #include "schema/MofReader.h"
 #include "schema/MofWriter.h"
 
 namespace cimhost {
 namespace {
 
-using Answers = Answer<std::vector<RawAnswer>>;
-
-ObjectManagerOptions managerOptions(const Arguments& arguments, const Locations& locations, const Schema& schema) {
+ObjectManagerOptions managerOptions(const SearchPaths& paths, const Schema& schema, const CommandExtension& extension) {
     ObjectManagerOptions options;
-    options.libraries.searchPath = locations.libraryPaths;
-    options.classShape = classShapes(schema);
-    options.manager = arguments.manager;
+    options.libraries.searchPath = paths.libraryPaths;
+    options.classInfo = classInfos(schema);
+    options.behaviour = extension.behaviour();
     return options;
 }
 
-Schema readSchema(const Locations& locations) {
+Schema readSchema(const SearchPaths& paths) {
     Schema schema;
     MofReader reader(schema);
-    for (const auto& file : locations.schemas) {
+    for (const auto& file : paths.schemas) {
         reader.readFile(file);
     }
     return schema;
 }
 
-std::vector<ProviderRegistration> readRegistrations(const Locations& locations) {
+std::vector<ProviderRegistration> readRegistrations(const SearchPaths& paths) {
     std::vector<ProviderRegistration> registrations;
-    for (const auto& file : locations.registrations) {
+    for (const auto& file : paths.registrations) {
         const std::vector<ProviderRegistration> found = readRegistrationFile(file);
         registrations.insert(registrations.end(), found.begin(), found.end());
     }
@@ -53,79 +47,44 @@ std::string mofOf(const std::vector<Instance>& instances) {
     return text;
 }
 
-Outcome showInstances(const Answers& answers, Operation operation, const Arguments& arguments) {
-    const Answer<std::vector<Instance>> found = resultsOf<Instance>(answers, operation);
-    if (!found.ok()) {
-        return {"", found.status};
-    }
+std::string formatted(const std::vector<Instance>& instances, const Arguments& arguments) {
     switch (arguments.format) {
         case Format::json:
-            return {json::format(found.value)};
+            return json::format(instances);
         case Format::mof:
-            return {mofOf(found.value)};
+            return mofOf(instances);
         default:
-            return {text::format(found.value, arguments.style)};
+            return text::format(instances, arguments.style);
     }
 }
 
-Outcome showInstance(const Answers& answers, const ObjectPath& path, const Arguments& arguments) {
-    const Answer<Instance> found = oneInstance(answers, path);
-    if (!found.ok()) {
-        return {"", found.status};
-    }
-    switch (arguments.format) {
-        case Format::json:
-            return {json::format(found.value)};
-        case Format::mof:
-            return {formatMof(found.value)};
-        default:
-            return {text::format(std::vector<Instance>{found.value}, arguments.style)};
-    }
+std::string formatted(const std::vector<ObjectPath>& paths, const Arguments& arguments) {
+    return arguments.format == Format::json ? json::format(paths) : text::format(paths, arguments.style);
 }
 
-Outcome showPaths(const Answers& answers, Operation operation, const Arguments& arguments) {
-    const Answer<std::vector<ObjectPath>> found = resultsOf<ObjectPath>(answers, operation);
-    if (!found.ok()) {
-        return {"", found.status};
-    }
-    return {arguments.format == Format::json ? json::format(found.value) : text::format(found.value, arguments.style)};
-}
-
-Outcome showCreated(const Answers& answers, const Arguments& arguments) {
-    const Answer<ObjectPath> created = createdPath(answers);
-    if (!created.ok()) {
-        return {"", created.status};
-    }
-    return {arguments.format == Format::json ? json::format(created.value)
-                                             : text::format(std::vector<ObjectPath>{created.value}, arguments.style)};
-}
-
-Outcome show(const Answers& answers, const Request& request, const Arguments& arguments) {
-    switch (request.operation) {
-        case Operation::enumerateInstances:
-        case Operation::associators:
-        case Operation::references:
-            return showInstances(answers, request.operation, arguments);
-        case Operation::enumerateInstanceNames:
-        case Operation::associatorNames:
-        case Operation::referenceNames:
-            return showPaths(answers, request.operation, arguments);
+/** The results of an operation in the form that the arguments name. A single result is no list in JSON. */
+std::string formatted(const Response& response, Operation operation, const Arguments& arguments) {
+    const bool isJson = arguments.format == Format::json;
+    switch (operation) {
+        case Operation::modifyInstance:
+        case Operation::deleteInstance:
+            return "";
         case Operation::getInstance:
-            return showInstance(answers, request.path, arguments);
+            return isJson ? json::format(response.instances.front()) : formatted(response.instances, arguments);
         case Operation::createInstance:
-            return showCreated(answers, arguments);
+            return isJson ? json::format(response.paths.front()) : formatted(response.paths, arguments);
         default:
-            return {"", statusOf(answers, request.operation)};
+            return returnsPaths(operation) ? formatted(response.paths, arguments)
+                                           : formatted(response.instances, arguments);
     }
 }
 
-Outcome showRaw(const Answers& answers, Operation operation, const Arguments& arguments) {
-    return {
-        arguments.format == Format::json ? json::format(answers.value) : text::format(answers.value, arguments.style),
-        statusOf(answers, operation)};
+std::string formattedRaw(const Response& response, const Arguments& arguments) {
+    return arguments.format == Format::json ? json::format(response.providers)
+                                            : text::format(response.providers, arguments.style);
 }
 
-/** What to try when there is no such class, namespace or instance. */
+/** The hint for an unknown class, namespace or instance; empty for other codes. */
 std::string hintFor(int code, const Request& request, const std::vector<ProviderRegistration>& registrations) {
     const std::string className = request.filter.associationClass.value_or(request.path.className);
     std::vector<std::string> names;
@@ -145,44 +104,58 @@ std::string hintFor(int code, const Request& request, const std::vector<Provider
     }
 }
 
-Outcome runRequest(const Arguments& arguments, const Locations& locations, const Schema& schema) {
-    const std::vector<ProviderRegistration> registrations = readRegistrations(locations);
+CommandResult runRequest(const Arguments& arguments, const SearchPaths& paths, const Schema& schema,
+                         const CommandExtension& extension) {
+    const std::vector<ProviderRegistration> registrations = readRegistrations(paths);
     const ProviderRegistry registry(registrations);
     try {
-        const Request request = buildRequest(arguments, schema);
-        ObjectManager manager(managerOptions(arguments, locations, schema), registry);
-        const Answers answers = manager.run(request);
+        Request request = buildRequest(arguments, schema);
+        extension.adapt(request);
+        ObjectManager manager(managerOptions(paths, schema, extension), registry);
+        const Response response = manager.perform(request);
         if (arguments.raw) {
-            return showRaw(answers, request.operation, arguments);
+            return {formattedRaw(response, arguments), response.status};
         }
-        Outcome outcome = show(answers, request, arguments);
-        outcome.hint = hintFor(outcome.status.rc, request, registrations);
-        return outcome;
+        return {response.ok() ? formatted(response, request.operation, arguments) : "", response.status, "",
+                hintFor(response.status.rc, request, registrations)};
     } catch (const UnknownClass& error) {
         return {"", {CMPI_RC_ERR_INVALID_CLASS, error.what()}};
     }
 }
 
+/** All classes of the schema in its order, then those that are only registered, each with its providers. */
+std::vector<ListedClass> listClasses(const Schema& schema, const std::vector<ProviderRegistration>& registrations) {
+    std::vector<ListedClass> list;
+    for (const Class* each : schema.classes()) {
+        list.push_back({each->name, each});
+    }
+    for (const ProviderRegistration& registration : registrations) {
+        const auto same = [&](const ListedClass& each) { return sameName(each.name, registration.className); };
+        auto listed = std::find_if(list.begin(), list.end(), same);
+        if (listed == list.end()) {
+            listed = list.insert(list.end(), {registration.className});
+        }
+        listed->providers.push_back(registration);
+    }
+    return list;
+}
+
 }  // namespace
 
-Outcome runCommand(const Arguments& arguments) {
+CommandResult runCommand(const Arguments& arguments, CommandExtension& extension) {
     if (arguments.format == Format::mof && (arguments.raw || !arguments.operation)) {
-        throw UsageError("--format mof shows instances; use text or json with --raw, for classes and for load");
+        throw UsageError("--format mof shows instances; use text or json for everything else");
     }
-    if (arguments.raw && arguments.isLoad) {
-        throw UsageError("--raw shows what a provider did with one request; load has many");
-    }
-    const Locations locations = findLocations(arguments);
-    const Schema schema = readSchema(locations);
+    const SearchPaths paths = findSearchPaths(arguments);
+    const Schema schema = readSchema(paths);
     if (arguments.operation) {
-        return runRequest(arguments, locations, schema);
+        return runRequest(arguments, paths, schema, extension);
     }
-    if (arguments.isLoad) {
-        ObjectManager manager(managerOptions(arguments, locations, schema),
-                              ProviderRegistry(readRegistrations(locations)));
-        return runLoadCommand(manager, arguments, schema);
+    if (extension.hasCommand()) {
+        ObjectManager manager(managerOptions(paths, schema, extension), ProviderRegistry(readRegistrations(paths)));
+        return extension.run(manager, arguments, schema);
     }
-    const std::vector<ListedClass> classes = listClasses(schema, readRegistrations(locations));
+    const std::vector<ListedClass> classes = listClasses(schema, readRegistrations(paths));
     return {arguments.format == Format::json ? json::format(classes) : text::format(classes, arguments.style)};
 }
 

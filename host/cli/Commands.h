@@ -1,24 +1,45 @@
 #pragma once
 
+#include <memory>
 #include <string>
 
 #include "cli/Arguments.h"
 #include "model/Status.h"
+#include "operations/ObjectManager.h"
+#include "schema/Schema.h"
 
 namespace cimhost {
 
-/** What a command has to say: text for standard output, and how its request ended. */
-struct Outcome {
+/** The result of a command: output for standard output, and the status of its request. */
+struct CommandResult {
     std::string output{};
     Status status{};
-    std::string complaint{};  ///< what is wrong although the request itself ended well; empty: nothing
-    std::string hint{};       ///< what to try where the request did not end well; empty: nothing
+    std::string failure{};  ///< message for standard error although the request was OK; empty: none
+    std::string hint{};     ///< what to try after a failed request; empty: nothing
+};
+
+/** How a program runs its commands; cimhost itself uses the defaults. */
+class CommandExtension {
+public:
+    virtual ~CommandExtension() = default;
+
+    /** Null: the standard behaviour. */
+    virtual std::shared_ptr<const ManagerBehaviour> behaviour() const { return nullptr; }
+
+    /** Changes a request as the clients of the emulated manager would. */
+    virtual void adapt(Request&) const {}
+
+    /** Whether a command was given that the program adds to those of cimhost. */
+    virtual bool hasCommand() const { return false; }
+
+    /** Runs that command. */
+    virtual CommandResult run(ObjectManager&, const Arguments&, const Schema&) { return {}; }
 };
 
 /**
- * Does a command line's work: loads schema and registrations, runs the request, unloads the providers.
+ * Runs the command of a command line: loads schema and registrations, performs the request, unloads the providers.
  * UsageError, ValueError and PathError for a wrong command line, LoadError and LibraryError for what cannot be loaded.
  */
-Outcome runCommand(const Arguments& arguments);
+CommandResult runCommand(const Arguments& arguments, CommandExtension& extension);
 
 }  // namespace cimhost

@@ -1,4 +1,4 @@
-#include "cli/JsonOutput.h"
+#include "cli/Output.h"
 
 #include <nlohmann/json.hpp>
 
@@ -102,19 +102,19 @@ struct EventJson {
     Json operator()(const Done&) const { return {{"kind", "done"}}; }
 };
 
-Json answerJson(const RawAnswer& answer) {
+Json responseJson(const ProviderResponse& response) {
     Json returned = Json::array();
-    for (const ResultEvent& event : answer.events) {
+    for (const ResultEvent& event : response.events) {
         returned.push_back(std::visit(EventJson{}, event));
     }
-    const bool hasText = answer.hasMessage || answer.threw;
+    const bool hasText = response.hasMessage || response.threw;
     return {{"status",
-             {{"code", static_cast<int>(answer.status.rc)},
-              {"name", codeName(answer.status.rc)},
-              {"message", hasText ? Json(answer.status.message) : Json(nullptr)}}},
-            {"exception", answer.threw},
+             {{"code", static_cast<int>(response.status.rc)},
+              {"name", codeName(response.status.rc)},
+              {"message", hasText ? Json(response.status.message) : Json(nullptr)}}},
+            {"exception", response.threw},
             {"returned", returned},
-            {"returnDoneCount", answer.doneCount()}};
+            {"returnDoneCount", response.doneCount()}};
 }
 
 Json providerJson(const ProviderRegistration& provider) {
@@ -177,8 +177,8 @@ std::string format(const ObjectPath& path) {
     return dumped(pathJson(path));
 }
 
-std::string format(const std::vector<RawAnswer>& answers) {
-    return dumped({{"answers", listJson(answers, answerJson)}});
+std::string format(const std::vector<ProviderResponse>& responses) {
+    return dumped({{"answers", listJson(responses, responseJson)}});
 }
 
 std::string format(const std::vector<ListedClass>& classes) {

@@ -5,7 +5,7 @@
 #include "broker/NamedValues.h"
 #include "cli/ExitStatus.h"
 #include "cli/Suggestion.h"
-#include "cli/Words.h"
+#include "cli/TextLayout.h"
 #include "schema/Literal.h"
 #include "schema/MofWriter.h"
 #include "schema/ObjectPathText.h"
@@ -58,7 +58,7 @@ public:
 
     void setNull(const std::string& name) {
         const Property& property = propertyOf(known, name);
-        add({property.name, Value{property.type, property.isArray}});
+        add({property.name, property.isArray ? Value::nullArray(property.type) : Value::null(property.type)});
     }
 
     std::vector<NamedValue> values{};
@@ -90,7 +90,7 @@ std::vector<NamedValue> readValues(const Arguments& arguments, const ObjectPath&
     return std::move(reader.values);
 }
 
-/** Keys may stand in the path, among the values, or in both; afterwards they stand in both, in front of the values. */
+/** Keys may be in the path, among the values, or in both; copies them to both, before the other values. */
 void joinKeys(Request& request, const Schema& schema) {
     std::vector<NamedValue>& properties = request.instance.properties;
     const Class* known = schema.findClass(request.path.className);
@@ -131,9 +131,7 @@ void addInstance(Request& request, const Arguments& arguments, const Schema& sch
         if (request.instance.properties.empty()) {
             throw UsageError("there is nothing to modify: write NAME=VALUE or --null NAME");
         }
-        if (arguments.manager != Manager::sfcb) {  // the clients that come with it send no list
-            request.properties = namesOf(request.instance.properties);
-        }
+        request.properties = namesOf(request.instance.properties);
     }
     request.instance.path = request.path;
 }

@@ -7,7 +7,7 @@
 
 namespace cimhost {
 
-/** Values for a class of which nothing is known. */
+/** Values are given for a class that the schema does not have. */
 class UnknownClass : public std::runtime_error {
 public:
     using std::runtime_error::runtime_error;

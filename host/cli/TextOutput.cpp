@@ -1,7 +1,4 @@
-#include "cli/TextOutput.h"
-
-#include "cli/Table.h"
-#include "cli/Words.h"
+#include "cli/Output.h"
 #include "operations/StatusText.h"
 #include "schema/CimType.h"
 #include "schema/MofWriter.h"
@@ -47,17 +44,17 @@ struct EventText {
     std::string operator()(const Done&) const { return "done\n"; }
 };
 
-std::string answerText(const RawAnswer& answer, const Style& style) {
-    std::string text = "status: " + std::to_string(answer.status.rc) + " (" + codeName(answer.status.rc) + ")\n";
-    if (answer.hasMessage || answer.threw) {
-        const Value message{CMPI_string, false, false, {answer.status.message}};
-        text += (answer.threw ? "exception: " : "message: ") + formatMof(message) + "\n";
+std::string responseText(const ProviderResponse& response, const Style& style) {
+    std::string text = "status: " + std::to_string(response.status.rc) + " (" + codeName(response.status.rc) + ")\n";
+    if (response.hasMessage || response.threw) {
+        const Value message = Value::of(response.status.message);
+        text += (response.threw ? "exception: " : "message: ") + formatMof(message) + "\n";
     }
     int number = 0;
-    for (const ResultEvent& event : answer.events) {
+    for (const ResultEvent& event : response.events) {
         text += std::to_string(++number) + ". " + std::visit(EventText{style}, event);
     }
-    return text + "returnDone: " + std::to_string(answer.doneCount()) + "\n";
+    return text + "returnDone: " + std::to_string(response.doneCount()) + "\n";
 }
 
 Row providerRow(const ListedClass& listed, const ProviderRegistration& provider) {
@@ -90,10 +87,10 @@ std::string format(const std::vector<ObjectPath>& paths, const Style& style) {
     return text;
 }
 
-std::string format(const std::vector<RawAnswer>& answers, const Style& style) {
+std::string format(const std::vector<ProviderResponse>& responses, const Style& style) {
     std::string text;
-    for (const RawAnswer& answer : answers) {
-        text += (text.empty() ? "" : "\n") + answerText(answer, style);
+    for (const ProviderResponse& response : responses) {
+        text += (text.empty() ? "" : "\n") + responseText(response, style);
     }
     return text;
 }

@@ -1,21 +1,43 @@
 #pragma once
 
+#include <cmpidt.h>
+
 #include <algorithm>
+#include <optional>
+#include <string>
 #include <variant>
 #include <vector>
 
-#include "model/ErrorInfo.h"
 #include "model/Value.h"
 
 namespace cimhost {
 
-/** A provider's announcement that it returns nothing more. */
+/** An extended error that a provider describes: the attributes of a CMPIError. Strings that are not set are none. */
+struct ErrorInfo {
+    std::optional<std::string> owningEntity{};
+    std::optional<std::string> messageId{};
+    std::optional<std::string> message{};
+    CMPIErrorSeverity severity = ErrorSevUnknown;
+    CMPIErrorProbableCause probableCause = ErrorProbCauseUnknown;
+    CMPIrc statusCode = CMPI_RC_OK;
+    CMPIErrorType type = UnknownErrorType;
+    CMPIErrorSrcFormat sourceFormat = CMPIErrSrcUnknown;
+    std::optional<std::string> otherType{};
+    std::optional<std::string> probableCauseDescription{};
+    std::optional<std::string> source{};
+    std::optional<std::string> otherSourceFormat{};
+    std::optional<std::string> statusCodeDescription{};
+    std::optional<std::vector<std::string>> recommendedActions{};
+    std::optional<std::vector<std::string>> messageArguments{};
+};
+
+/** A call of returnDone. */
 struct Done {};
 
 /** A null pointer that a provider returned as an instance, an object path or an error. The result refused it. */
 struct NullResult {};
 
-/** What a provider passed to its result: an instance, an object path, data, an error, null, or that it is done. */
+/** One call of a result function: an instance, an object path, data, an error or null was returned, or returnDone. */
 using ResultEvent = std::variant<Instance, ObjectPath, Value, ErrorInfo, NullResult, Done>;
 
 /** What a provider returned, in order, each as it was at the time of the call. */
@@ -33,7 +55,7 @@ std::vector<Kind> eventsOf(const ResultEvents& events) {
     return found;
 }
 
-/** How often the provider said that it was done. */
+/** Number of calls of returnDone. */
 inline int doneCount(const ResultEvents& events) {
     return static_cast<int>(std::count_if(
         events.begin(), events.end(), [](const ResultEvent& event) { return std::holds_alternative<Done>(event); }));

@@ -31,27 +31,37 @@ using Scalar = std::variant<std::monostate, bool, Char16, std::uint8_t, std::uin
                             std::int8_t, std::int16_t, std::int32_t, std::int64_t, float, double, std::string, DateTime,
                             std::shared_ptr<const ObjectPath>, std::shared_ptr<const Instance>>;
 
-/**
- * A CIM value with its declared type, which a null value has too.
- * A hollow text has one element, null: a string object without characters, as some object managers pass to providers,
- * also in the place of null.
- */
+/** The CIM type of a Scalar's alternative, such as CMPI_uint32 for std::uint32_t; CMPI_null for std::monostate. */
+CMPIType typeOf(const Scalar& scalar);
+
+/** A CIM value with its declared type, which a null value has too. */
 struct Value {
     CMPIType type = CMPI_null;       ///< element type, without CMPI_ARRAY
     bool isArray = false;            ///< whether it is an array of that type
     bool isNull = true;              ///< null as a whole
     std::vector<Scalar> elements{};  ///< one element unless an array; none when null
+
+    /** A single value of the scalar's own type. */
+    static Value of(Scalar scalar);
+    static Value of(const char* characters);
+
+    /** A single value of a declared type; null if the scalar is null. */
+    static Value of(CMPIType type, Scalar scalar);
+    static Value array(CMPIType type, std::vector<Scalar> elements);
+
+    static Value null(CMPIType type);
+    static Value nullArray(CMPIType type);
+
+    /** @name Strings without characters
+     * Some object managers pass string objects whose character pointer is null. The second is null as well: its data
+     * has the state CMPI_nullValue and yet an object. Either has one element, which is null.
+     */
+    ///@{
+    static Value stringWithoutCharacters();
+    static Value nullStringObject();
+    bool isStringWithoutCharacters() const;
+    ///@}
 };
-
-/** A text that is there and has no characters, or is null and yet an object. */
-inline Value hollowText(bool isNull) {
-    return {CMPI_string, false, isNull, {std::monostate{}}};
-}
-
-inline bool isHollow(const Value& value) {
-    return value.type == CMPI_string && !value.isArray && value.elements.size() == 1 &&
-           std::holds_alternative<std::monostate>(value.elements.front());
-}
 
 /** A named value: a key of an object path or a property of an instance. */
 struct NamedValue {

@@ -1,9 +1,5 @@
 #include "operations/Interfaces.h"
 
-#include "broker/RequestScope.h"
-#include "operations/LibraryError.h"
-#include "operations/ProviderCall.h"
-
 namespace cimhost {
 namespace {
 
@@ -13,17 +9,17 @@ using NamedFactory = Interface*(const CMPIBroker*, const CMPIContext*, CMPIStatu
 template <class Interface>
 using GenericFactory = Interface*(const CMPIBroker*, const CMPIContext*, const char*, CMPIStatus*);
 
-/** Calls the factory that the broker's manager would. */
+/** Calls one of the two factories that a library can have for a provider. */
 template <class Interface>
 Interface* callFactory(const LoadedLibrary& library, const std::string& provider, FactoryChoice choice,
                        const CMPIBroker* broker, const CMPIContext* context, CMPIStatus* rc) {
     const std::string suffix = std::string("_Create_") + nameOf(InterfaceTraits<Interface>::kind) + "MI";
     auto* named = library.function<NamedFactory<Interface>>(provider + suffix);
     auto* generic = library.function<GenericFactory<Interface>>("_Generic" + suffix);
-    if (named != nullptr && generic != nullptr && choice == FactoryChoice::onlyOne) {
+    if (named != nullptr && generic != nullptr && choice == FactoryChoice::neither) {
         throw LibraryError(library.file().string() + " has both " + provider + suffix + " and _Generic" + suffix);
     }
-    if (named != nullptr && (generic == nullptr || choice != FactoryChoice::genericFirst)) {
+    if (named != nullptr && (generic == nullptr || choice == FactoryChoice::named)) {
         return named(broker, context, rc);
     }
     if (generic != nullptr) {
@@ -45,13 +41,13 @@ const char* nameOf(InterfaceKind kind) {
 
 template <class Interface>
 Interface* createInterface(const LoadedLibrary& library, const std::string& provider, Broker& broker,
-                           const CMPIBroker* handle) {
+                           FactoryChoice choice) {
     RequestScope scope(broker);
     const CMPIContext* context = scope.context({});
     Interface* interface = nullptr;
     const ProviderCall call = callProvider([&] {
         CMPIStatus status{CMPI_RC_OK, nullptr};
-        interface = callFactory<Interface>(library, provider, broker.profile().factory, handle, context, &status);
+        interface = callFactory<Interface>(library, provider, choice, broker.handle(), context, &status);
         return status;
     });
     if (!call.status.ok()) {
@@ -74,8 +70,8 @@ int cleanUp(Interface* interface, Broker& broker, bool terminating) {
     return callProvider([&] { return interface->ft->cleanup(interface, context, flag); }).status.rc;
 }
 
-template CMPIInstanceMI* createInterface(const LoadedLibrary&, const std::string&, Broker&, const CMPIBroker*);
-template CMPIAssociationMI* createInterface(const LoadedLibrary&, const std::string&, Broker&, const CMPIBroker*);
+template CMPIInstanceMI* createInterface(const LoadedLibrary&, const std::string&, Broker&, FactoryChoice);
+template CMPIAssociationMI* createInterface(const LoadedLibrary&, const std::string&, Broker&, FactoryChoice);
 template int cleanUp(CMPIInstanceMI*, Broker&, bool);
 template int cleanUp(CMPIAssociationMI*, Broker&, bool);
 

@@ -2,8 +2,6 @@
 
 #include <utility>
 
-#include "operations/LibraryError.h"
-
 namespace cimhost {
 namespace {
 
@@ -37,7 +35,7 @@ LoadedLibrary::LoadedLibrary(std::filesystem::path itsFile, int flags)
     if (handle == nullptr) {
         const std::string text = "Cannot load " + libraryFile.string() + ": " + reason();
         if (libraryFile.has_parent_path()) {
-            throw LibraryError(text);
+            throw LibraryNotLoaded(text);
         }
         throw LibraryNotFound(text);
     }

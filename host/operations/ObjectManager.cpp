@@ -4,17 +4,12 @@
 #include <utility>
 
 #include "broker/NamedValues.h"
-#include "operations/Interpretation.h"
 #include "operations/RequestRunner.h"
-#include "operations/Typing.h"
+#include "operations/ResponseMapping.h"
 #include "schema/Names.h"
 
 namespace cimhost {
 namespace {
-
-Value textValue(std::string text) {
-    return {CMPI_string, false, false, {std::move(text)}};
-}
 
 void addIfMissing(ContextEntries& entries, const char* name, Value value) {
     if (findNamed(entries, name) == nullptr) {
@@ -30,13 +25,12 @@ Status noProvider(const Request& request, const std::string& className) {
                                            " in namespace " + request.path.nameSpace + "."};
 }
 
-/** The filter that carries the association class: of references, it is the class of their results. */
+/** The member of the filter that names the association class: for references, the result class. */
 auto associationClassOf(Operation operation) {
-    const bool isReference = operation == Operation::references || operation == Operation::referenceNames;
-    return isReference ? &AssociationFilter::resultClass : &AssociationFilter::associationClass;
+    return isReferenceOperation(operation) ? &AssociationFilter::resultClass : &AssociationFilter::associationClass;
 }
 
-/** The instance for a provider to create: keys that are only in the path come first. */
+/** The instance of a creation: keys that are only in the path precede its properties. */
 Instance withKeys(const ObjectPath& path, const Instance& instance) {
     Instance complete{path, {}};
     for (const NamedValue& key : path.keys) {
@@ -48,7 +42,7 @@ Instance withKeys(const ObjectPath& path, const Instance& instance) {
     return complete;
 }
 
-/** Leaves one class of each provider, the first. */
+/** Keeps only the first class of each provider. */
 void dropSameProviders(std::vector<const ServedClass*>& classes) {
     std::vector<const ServedClass*> kept;
     std::copy_if(classes.begin(), classes.end(), std::back_inserter(kept), [&](const ServedClass* each) {
@@ -63,10 +57,14 @@ void dropSameProviders(std::vector<const ServedClass*>& classes) {
 }  // namespace
 
 ObjectManager::ObjectManager(ObjectManagerOptions itsOptions, ProviderRegistry itsRegistry)
-    : baseContext(std::move(itsOptions.context)),
+    : ownedBehaviour(std::move(itsOptions.behaviour)),
+      behaviour(ownedBehaviour == nullptr ? ManagerBehaviour::standard() : *ownedBehaviour),
+      policy(behaviour.policy()),
+      baseContext(std::move(itsOptions.context)),
       providers(std::move(itsRegistry)),
-      itsBroker({std::move(itsOptions.classShape), this, std::move(itsOptions.log), nullptr, itsOptions.manager}),
-      pool(itsBroker, std::move(itsOptions.libraries)) {}
+      itsBroker({std::move(itsOptions.classInfo), this, std::move(itsOptions.log), &behaviour.tables(),
+                 behaviour.hasMemoryTable()}),
+      pool(itsBroker, std::move(itsOptions.libraries), policy) {}
 
 ObjectManager::~ObjectManager() = default;
 
@@ -74,16 +72,14 @@ void ObjectManager::completeContext(Request& request) const {
     for (const NamedValue& entry : baseContext) {
         addIfMissing(request.context, entry.name.c_str(), entry.value);
     }
-    addIfMissing(request.context, CMPIInvocationFlags, {CMPI_uint32, false, false, {std::uint32_t{0}}});
-    addIfMissing(request.context, CMPIInitNameSpace, textValue(request.path.nameSpace));
-    if (!itsBroker.profile().hollowTexts) {
-        addIfMissing(request.context, CMPIPrincipal, textValue({}));
-    }
+    addIfMissing(request.context, CMPIInvocationFlags, Value::of(std::uint32_t{0}));
+    addIfMissing(request.context, CMPIInitNameSpace, Value::of(request.path.nameSpace));
+    addIfMissing(request.context, CMPIPrincipal, behaviour.principal());
 }
 
 ProviderAddress ObjectManager::addressOf(const ServedClass& served) const {
     ProviderAddress address = served.address;
-    if (itsBroker.profile().startsProviderPerClass) {
+    if (policy.startsProviderPerClass) {
         address.forClass = foldedName(served.className);
     }
     return address;
@@ -92,7 +88,7 @@ ProviderAddress ObjectManager::addressOf(const ServedClass& served) const {
 template <class Interface>
 Interface* ObjectManager::started(const ServedClass& served) {
     const ProviderAddress address = addressOf(served);
-    if (itsBroker.profile().startsAllInterfaces) {
+    if (policy.startsAllInterfaces) {
         if (providers.find(served.nameSpace, served.className, InterfaceKind::instance) != nullptr) {
             pool.get<CMPIInstanceMI>(address);
         }
@@ -104,60 +100,76 @@ Interface* ObjectManager::started(const ServedClass& served) {
 }
 
 template <class Interface>
-RawAnswer ObjectManager::ask(const ServedClass& served, const Request& request) {
-    RawAnswer answer = runRequest(itsBroker, started<Interface>(served), request);
-    if (!fatality(answer, request.operation).empty()) {
-        pool.lose(served.address.location);
+ProviderResponse ObjectManager::call(const ServedClass& served, const Request& request) {
+    ProviderResponse response = runRequest(itsBroker, started<Interface>(served), request, behaviour);
+    if (!response.crashReason.empty()) {
+        pool.unloadWhenUnused(served.address.location);
     }
-    return answer;
+    return response;
 }
 
-Answer<std::vector<RawAnswer>> ObjectManager::run(Request request) {
-    const ProviderPool::Stay stay(pool);
+Response ObjectManager::perform(Request request) {
+    const ProviderPool::InUse use(pool);
     if (pool.isStopped()) {
-        return {{CMPI_RC_ERR_FAILED, stoppingText}, {}};
+        return Response::failed({CMPI_RC_ERR_FAILED, stoppingText});
+    }
+    if (request.operation == Operation::execQuery || request.operation > Operation::referenceNames) {
+        return notSupported(request.operation);
     }
     if (!providers.knowsNameSpace(request.path.nameSpace)) {
-        return {{CMPI_RC_ERR_INVALID_NAMESPACE, "There is no namespace " + request.path.nameSpace + "."}, {}};
+        return Response::failed(
+            {CMPI_RC_ERR_INVALID_NAMESPACE, "There is no namespace " + request.path.nameSpace + "."});
     }
     completeContext(request);
-    return isAssociationOperation(request.operation) ? runForAssociation(std::move(request))
-                                                     : runForInstance(std::move(request));
+    try {
+        return isAssociationOperation(request.operation) ? performForAssociation(std::move(request))
+                                                         : performForInstance(std::move(request));
+    } catch (const LibraryNotLoaded& error) {
+        const std::optional<Status> status = behaviour.statusOf(error);
+        if (!status) {
+            throw;
+        }
+        return Response::failed(*status);
+    }
 }
 
-Answer<std::vector<RawAnswer>> ObjectManager::runForInstance(Request request) {
-    const ObjectPath& path = request.path;
-    const ServedClass* served = providers.find(path.nameSpace, path.className, InterfaceKind::instance);
+Response ObjectManager::performForInstance(Request request) {
+    const ServedClass* served = providers.find(request.path.nameSpace, request.path.className, InterfaceKind::instance);
     if (served == nullptr) {
-        return {noProvider(request, path.className), {}};
+        return Response::failed(noProvider(request, request.path.className));
     }
-    const Status refusal = takeTypes(request, itsBroker);
+    if (request.operation == Operation::createInstance) {
+        request.instance = withKeys(request.path, request.instance);
+    } else {
+        request.instance.path = request.path;
+    }
+    const Status refusal = behaviour.coerceTypes(request, itsBroker);
     if (!refusal.ok()) {
-        return {refusal, {}};
+        return Response::failed(refusal);
     }
-    return {{}, {ask<CMPIInstanceMI>(*served, request)}};
+    return mapResponses(behaviour, request, {call<CMPIInstanceMI>(*served, request)});
 }
 
-Answer<std::vector<RawAnswer>> ObjectManager::runForAssociation(Request request) {
+Response ObjectManager::performForAssociation(Request request) {
     const auto associationClass = associationClassOf(request.operation);
-    const std::optional<std::string> asked = request.filter.*associationClass;
-    std::vector<const ServedClass*> found = associationsFor(request.path.nameSpace, asked);
+    const std::optional<std::string> requested = request.filter.*associationClass;
+    std::vector<const ServedClass*> found = associationsFor(request.path.nameSpace, requested);
     if (found.empty()) {
-        return {noProvider(request, asked.value_or(std::string{})), {}};
+        return Response::failed(noProvider(request, requested.value_or(std::string{})));
     }
-    const bool tellsClass = itsBroker.profile().fillsAssociationClass;
-    if (!tellsClass) {
+    const bool namesClass = behaviour.namesAssociationClass();
+    if (!namesClass) {
         dropSameProviders(found);
     }
-    std::vector<RawAnswer> answers;
+    std::vector<ProviderResponse> responses;
     for (const ServedClass* served : found) {
-        if (tellsClass) {
-            const bool isAsked = asked && sameName(served->className, *asked);
-            request.filter.*associationClass = isAsked ? *asked : served->className;
+        if (namesClass) {
+            const bool isRequested = requested && sameName(served->className, *requested);
+            request.filter.*associationClass = isRequested ? *requested : served->className;
         }
-        answers.push_back(ask<CMPIAssociationMI>(*served, request));
+        responses.push_back(call<CMPIAssociationMI>(*served, request));
     }
-    return {{}, std::move(answers)};
+    return mapResponses(behaviour, request, std::move(responses));
 }
 
 std::vector<const ServedClass*> ObjectManager::associationsFor(const std::string& nameSpace,
@@ -168,64 +180,6 @@ std::vector<const ServedClass*> ObjectManager::associationsFor(const std::string
         found.erase(std::remove_if(found.begin(), found.end(), isOther), found.end());
     }
     return found;
-}
-
-Answer<std::vector<Instance>> ObjectManager::enumerateInstances(const ContextEntries& context, const ObjectPath& path,
-                                                                const PropertyList& properties) {
-    const auto operation = Operation::enumerateInstances;
-    return resultsOf<Instance>(run({operation, path, properties, {}, {}, context}), operation);
-}
-
-Answer<std::vector<ObjectPath>> ObjectManager::enumerateInstanceNames(const ContextEntries& context,
-                                                                      const ObjectPath& path) {
-    const auto operation = Operation::enumerateInstanceNames;
-    return resultsOf<ObjectPath>(run({operation, path, {}, {}, {}, context}), operation);
-}
-
-Answer<Instance> ObjectManager::getInstance(const ContextEntries& context, const ObjectPath& path,
-                                            const PropertyList& properties) {
-    return oneInstance(run({Operation::getInstance, path, properties, {}, {}, context}), path);
-}
-
-Answer<ObjectPath> ObjectManager::createInstance(const ContextEntries& context, const ObjectPath& path,
-                                                 const Instance& instance) {
-    return createdPath(run({Operation::createInstance, path, {}, withKeys(path, instance), {}, context}));
-}
-
-Status ObjectManager::modifyInstance(const ContextEntries& context, const ObjectPath& path, const Instance& instance,
-                                     const PropertyList& properties) {
-    const Instance handed{path, instance.properties};
-    return statusOf(run({Operation::modifyInstance, path, properties, handed, {}, context}), Operation::modifyInstance);
-}
-
-Status ObjectManager::deleteInstance(const ContextEntries& context, const ObjectPath& path) {
-    return statusOf(run({Operation::deleteInstance, path, {}, {}, {}, context}), Operation::deleteInstance);
-}
-
-Answer<std::vector<Instance>> ObjectManager::associators(const ContextEntries& context, const ObjectPath& path,
-                                                         const AssociationFilter& filter,
-                                                         const PropertyList& properties) {
-    const auto operation = Operation::associators;
-    return resultsOf<Instance>(run({operation, path, properties, {}, filter, context}), operation);
-}
-
-Answer<std::vector<ObjectPath>> ObjectManager::associatorNames(const ContextEntries& context, const ObjectPath& path,
-                                                               const AssociationFilter& filter) {
-    const auto operation = Operation::associatorNames;
-    return resultsOf<ObjectPath>(run({operation, path, {}, {}, filter, context}), operation);
-}
-
-Answer<std::vector<Instance>> ObjectManager::references(const ContextEntries& context, const ObjectPath& path,
-                                                        const AssociationFilter& filter,
-                                                        const PropertyList& properties) {
-    const auto operation = Operation::references;
-    return resultsOf<Instance>(run({operation, path, properties, {}, filter, context}), operation);
-}
-
-Answer<std::vector<ObjectPath>> ObjectManager::referenceNames(const ContextEntries& context, const ObjectPath& path,
-                                                              const AssociationFilter& filter) {
-    const auto operation = Operation::referenceNames;
-    return resultsOf<ObjectPath>(run({operation, path, {}, {}, filter, context}), operation);
 }
 
 }  // namespace cimhost

@@ -7,8 +7,6 @@
 #include <utility>
 #include <vector>
 
-#include "operations/LibraryError.h"
-
 namespace cimhost {
 namespace {
 
@@ -31,20 +29,20 @@ private:
 
 }  // namespace
 
-ProviderPool::ProviderPool(Broker& itsBroker, LibraryOptions itsOptions)
-    : broker(itsBroker), options(std::move(itsOptions)) {}
+ProviderPool::ProviderPool(Broker& itsBroker, LibraryOptions itsOptions, const ProviderPolicy& itsPolicy)
+    : broker(itsBroker), options(std::move(itsOptions)), policy(itsPolicy) {}
 
 ProviderPool::~ProviderPool() {
     stop();
 }
 
-ProviderPool::Stay::Stay(ProviderPool& itsPool) : pool(itsPool) {
-    ++pool.staying;
+ProviderPool::InUse::InUse(ProviderPool& itsPool) : pool(itsPool) {
+    ++pool.uses;
 }
 
-ProviderPool::Stay::~Stay() {
-    if (--pool.staying == 0) {
-        pool.unloadLost();
+ProviderPool::InUse::~InUse() {
+    if (--pool.uses == 0) {
+        pool.unloadCrashed();
     }
 }
 
@@ -77,11 +75,11 @@ bool ProviderPool::staysWhenIdle(const LoadedLibrary& library) {
             ask(provider.association);
         }
     }
-    return broker.profile().staysIfAllAsk ? asking == interfaces : asking > 0;
+    return policy.staysOnlyIfAllAsk ? asking == interfaces : asking > 0;
 }
 
 void ProviderPool::idle() {
-    const Stay stay(*this);
+    const InUse use(*this);
     const std::lock_guard<ChainMutex> lock(mutex);
     for (auto library = libraries.begin(); library != libraries.end();) {
         const LoadedLibrary* loaded = library->second.get();
@@ -100,20 +98,20 @@ ProviderPool::Libraries::iterator ProviderPool::unload(Libraries::iterator libra
     return libraries.erase(library);
 }
 
-void ProviderPool::lose(const std::string& location) {
-    const std::lock_guard<std::mutex> lock(lostMutex);
-    lost.insert(location);
+void ProviderPool::unloadWhenUnused(const std::string& location) {
+    const std::lock_guard<std::mutex> lock(crashedMutex);
+    crashed.insert(location);
 }
 
-/** Who begins to stay meanwhile waits for the mutex before it has an interface. */
-void ProviderPool::unloadLost() {
-    const std::lock_guard<std::mutex> lostLock(lostMutex);
-    if (lost.empty()) {
+/** A request that arrives meanwhile waits for the mutex before it receives an interface. */
+void ProviderPool::unloadCrashed() {
+    const std::lock_guard<std::mutex> crashedLock(crashedMutex);
+    if (crashed.empty()) {
         return;
     }
     const std::lock_guard<ChainMutex> lock(mutex);
-    for (auto location = lost.begin(); location != lost.end() && staying == 0 && !stopped;
-         location = lost.erase(location)) {
+    for (auto location = crashed.begin(); location != crashed.end() && uses == 0 && !stopped;
+         location = crashed.erase(location)) {
         const auto library = libraries.find(*location);
         if (library != libraries.end()) {
             unload(library);
@@ -123,7 +121,7 @@ void ProviderPool::unloadLost() {
 
 /** A cleanup may wait for requests, which may need a mutex: none is held then. */
 void ProviderPool::stop() {
-    const Stay stay(*this);
+    const InUse use(*this);
     if (stopped.exchange(true)) {
         return;
     }
@@ -135,7 +133,7 @@ void ProviderPool::stop() {
         }
     }
     for (Provider* provider : all) {
-        std::unique_lock<ChainMutex> lock(guardOf(*provider));
+        std::unique_lock<ChainMutex> lock(mutexOf(*provider));
         LoadedLibrary* const library = provider->library;
         CMPIInstanceMI* const instance = provider->instance;
         CMPIAssociationMI* const association = provider->association;
@@ -155,8 +153,7 @@ void ProviderPool::end(LoadedLibrary* library, Interface* interface) {
 LoadedLibrary& ProviderPool::library(const std::string& location) {
     auto& entry = libraries[location];
     if (!entry) {
-        const bool isLazy = broker.profile().loadsLazily;
-        const int flags = isLazy ? (options.flags & ~RTLD_NOW) | RTLD_LAZY : options.flags;
+        const int flags = policy.bindsLazily ? (options.flags & ~RTLD_NOW) | RTLD_LAZY : options.flags;
         entry = std::make_unique<LoadedLibrary>(findLibrary(location, options), flags);
     }
     return *entry;
@@ -174,7 +171,7 @@ ProviderPool::Provider& ProviderPool::provider(const ProviderAddress& address) {
 template <class Interface>
 Interface* ProviderPool::get(const ProviderAddress& address) {
     Provider& found = provider(address);
-    const std::lock_guard<ChainMutex> lock(guardOf(found));
+    const std::lock_guard<ChainMutex> lock(mutexOf(found));
     Interface*& interface = member<Interface>(found);
     if (interface == nullptr) {
         requireRunning();
@@ -182,7 +179,7 @@ Interface* ProviderPool::get(const ProviderAddress& address) {
             throw LibraryError("Provider " + address.provider + " needs itself to start.");
         }
         const Starting starting(found.isStarting);
-        Interface* made = createInterface<Interface>(*found.library, address.provider, broker, broker.handle());
+        Interface* made = createInterface<Interface>(*found.library, address.provider, broker, policy.factory);
         if (stopped) {
             end(found.library, made);
         }
@@ -198,8 +195,8 @@ void ProviderPool::requireRunning() const {
     }
 }
 
-ChainMutex& ProviderPool::guardOf(Provider& provider) {
-    return broker.profile().startsAtOnce ? provider.mutex : mutex;
+ChainMutex& ProviderPool::mutexOf(Provider& provider) {
+    return policy.startsConcurrently ? provider.mutex : mutex;
 }
 
 template CMPIInstanceMI* ProviderPool::get(const ProviderAddress&);

@@ -15,7 +15,7 @@
 
 namespace cimhost {
 
-/** What comes too late is told. */
+/** Message for requests that arrive after stop(). */
 constexpr const char* stoppingText = "The object manager is stopping.";
 
 /**
@@ -25,37 +25,38 @@ constexpr const char* stoppingText = "The object manager is stopping.";
  */
 class ProviderPool {
 public:
-    ProviderPool(Broker& itsBroker, LibraryOptions itsOptions);
+    ProviderPool(Broker& itsBroker, LibraryOptions itsOptions, const ProviderPolicy& itsPolicy);
     ~ProviderPool();
     ProviderPool(const ProviderPool&) = delete;
     ProviderPool& operator=(const ProviderPool&) = delete;
 
-    /** A request's stay with the providers; requests may come out of requests. */
-    class Stay {
+    /** Marks the pool as used by a request; requests may be nested. */
+    class InUse {
     public:
-        explicit Stay(ProviderPool& itsPool);
-        ~Stay();
-        Stay(const Stay&) = delete;
-        Stay& operator=(const Stay&) = delete;
+        explicit InUse(ProviderPool& itsPool);
+        ~InUse();
+        InUse(const InUse&) = delete;
+        InUse& operator=(const InUse&) = delete;
 
     private:
         ProviderPool& pool;
     };
 
-    /** The provider's interface; good while the caller stays. @throws LibraryError when it cannot be had */
+    /** The provider's interface, valid while the caller's InUse lives. @throws LibraryError when it cannot be started
+     */
     template <class Interface>
     Interface* get(const ProviderAddress& address);
 
-    /** Cleans up all providers and unloads the libraries that do not ask to stay. Not while a request is inside. */
+    /** Cleans up all providers and unloads the libraries that do not ask to stay. Not while a request runs. */
     void idle();
 
     /**
-     * A library's process has ended: the library goes, without cleanup, when no request is inside, and is loaded again
-     * when it is needed.
+     * Unloads a library without cleanup, as if its process had ended, as soon as no request uses the pool. The next
+     * request that needs it loads it again.
      */
-    void lose(const std::string& location);
+    void unloadWhenUnused(const std::string& location);
 
-    /** Cleans up all providers for good, though requests may be inside. Libraries stay until the pool ends. */
+    /** Cleans up all providers for good, even while requests run. Libraries stay until the pool is destroyed. */
     void stop();
     bool isStopped() const { return stopped; }
 
@@ -85,13 +86,13 @@ private:
 
     /** Closes a library, and forgets its providers. */
     Libraries::iterator unload(Libraries::iterator library);
-    void unloadLost();
+    void unloadCrashed();
 
     /** Cleans up the providers of a library; whether it stays. */
     bool staysWhenIdle(const LoadedLibrary& library);
 
-    /** What guards the interfaces of a provider. */
-    ChainMutex& guardOf(Provider& provider);
+    /** The mutex of a provider's interfaces. */
+    ChainMutex& mutexOf(Provider& provider);
     void requireRunning() const;
 
     LoadedLibrary& library(const std::string& location);
@@ -99,12 +100,13 @@ private:
 
     Broker& broker;
     LibraryOptions options;
+    ProviderPolicy policy;
     ChainMutex mutex;  ///< held while a factory runs, which may make a request that needs another provider
     Libraries libraries;
     std::map<ProviderAddress, Provider, AddressLess> providers;
-    std::atomic<std::size_t> staying{0};
-    std::mutex lostMutex{};
-    std::set<std::string> lost;  ///< locations of libraries that go when nobody stays
+    std::atomic<std::size_t> uses{0};
+    std::mutex crashedMutex{};
+    std::set<std::string> crashed;  ///< locations of libraries to unload when the pool is not in use
     std::atomic<bool> stopped{false};
 };
 

@@ -2,9 +2,7 @@
 
 #include <stdexcept>
 
-#include "broker/PropertyLists.h"
-#include "operations/HandedOver.h"
-#include "operations/RequestThread.h"
+#include "broker/Convert.h"
 
 namespace cimhost {
 namespace {
@@ -17,26 +15,51 @@ CMPIStatus callEntry(Function* function, Arguments... arguments) {
     return function == nullptr ? notSupported : function(arguments...);
 }
 
-const char* textOf(const std::optional<std::string>& text) {
-    return text ? text->c_str() : nullptr;
+const char* charactersOf(const std::optional<std::string>& name) {
+    return name ? name->c_str() : nullptr;
 }
 
 [[noreturn]] void wrongInterface(Operation operation) {
     throw std::invalid_argument(std::string("not an operation of this interface: ") + nameOf(operation));
 }
 
-/** What the manager insists on in the answer to an operation. */
-ResultRules rulesOf(const Profile& profile, Operation operation) {
-    const bool creates = operation == Operation::createInstance;
-    return {creates && profile.created == CreationResult::pathOnly,
-            operation == Operation::getInstance && profile.refusesEmptyGet, creates && profile.keepsReturnedPath};
+bool takesInstance(Operation operation) {
+    return operation == Operation::createInstance || operation == Operation::modifyInstance;
 }
 
 CMPIStatus call(CMPIInstanceMI* interface, const Request& request, RequestScope& scope, const CMPIContext* context,
                 const CMPIResult* result) {
+    const CMPIInstance* instance = takesInstance(request.operation) ? scope.instance(request.instance) : nullptr;
+    return callOperation(interface, request, context, result, scope.objectPath(request.path), instance);
+}
+
+CMPIStatus call(CMPIAssociationMI* interface, const Request& request, RequestScope& scope, const CMPIContext* context,
+                const CMPIResult* result) {
+    return callOperation(interface, request, context, result, scope.objectPath(request.path));
+}
+
+template <class Interface>
+ProviderResponse run(Broker& broker, Interface* interface, Request request, const ManagerBehaviour& behaviour) {
+    ProviderResponse response;
+    behaviour.adapt(request, broker);
+    behaviour.onRequestThread([&] {
+        response = runCall(
+            broker, request.context,
+            [&](RequestScope& scope, const CMPIContext* context, const CMPIResult* result) {
+                return call(interface, request, scope, context, result);
+            },
+            behaviour.resultRules(request.operation));
+    });
+    response.crashReason = behaviour.crashReason(response, request.operation);
+    return response;
+}
+
+}  // namespace
+
+CMPIStatus callOperation(CMPIInstanceMI* interface, const Request& request, const CMPIContext* context,
+                         const CMPIResult* result, const CMPIObjectPath* path, const CMPIInstance* instance) {
     CPropertyList list(request.properties);
     const char** properties = list.get();
-    const CMPIObjectPath* path = scope.objectPath(request.path);
     const auto& table = *interface->ft;
     switch (request.operation) {
         case Operation::enumerateInstances:
@@ -46,28 +69,28 @@ CMPIStatus call(CMPIInstanceMI* interface, const Request& request, RequestScope&
         case Operation::getInstance:
             return callEntry(table.getInstance, interface, context, result, path, properties);
         case Operation::createInstance:
-            return callEntry(table.createInstance, interface, context, result, path, scope.instance(request.instance));
+            return callEntry(table.createInstance, interface, context, result, path, instance);
         case Operation::modifyInstance:
-            return callEntry(table.modifyInstance, interface, context, result, path, scope.instance(request.instance),
-                             properties);
+            return callEntry(table.modifyInstance, interface, context, result, path, instance, properties);
         case Operation::execQuery:
             return callEntry(table.execQuery, interface, context, result, path, request.language.c_str(),
                              request.query.c_str());
-        default:
+        case Operation::deleteInstance:
             return callEntry(table.deleteInstance, interface, context, result, path);
+        default:
+            wrongInterface(request.operation);
     }
 }
 
-CMPIStatus call(CMPIAssociationMI* interface, const Request& request, RequestScope& scope, const CMPIContext* context,
-                const CMPIResult* result) {
+CMPIStatus callOperation(CMPIAssociationMI* interface, const Request& request, const CMPIContext* context,
+                         const CMPIResult* result, const CMPIObjectPath* path) {
     CPropertyList list(request.properties);
     const char** properties = list.get();
-    const CMPIObjectPath* path = scope.objectPath(request.path);
     const auto& table = *interface->ft;
-    const char* associationClass = textOf(request.filter.associationClass);
-    const char* resultClass = textOf(request.filter.resultClass);
-    const char* role = textOf(request.filter.role);
-    const char* resultRole = textOf(request.filter.resultRole);
+    const char* associationClass = charactersOf(request.filter.associationClass);
+    const char* resultClass = charactersOf(request.filter.resultClass);
+    const char* role = charactersOf(request.filter.role);
+    const char* resultRole = charactersOf(request.filter.resultRole);
     switch (request.operation) {
         case Operation::associators:
             return callEntry(table.associators, interface, context, result, path, associationClass, resultClass, role,
@@ -77,43 +100,27 @@ CMPIStatus call(CMPIAssociationMI* interface, const Request& request, RequestSco
                              role, resultRole);
         case Operation::references:
             return callEntry(table.references, interface, context, result, path, resultClass, role, properties);
-        default:
+        case Operation::referenceNames:
             return callEntry(table.referenceNames, interface, context, result, path, resultClass, role);
+        default:
+            wrongInterface(request.operation);
     }
 }
 
-template <class Interface>
-RawAnswer run(Broker& broker, Interface* interface, const Request& request) {
-    return onRequestThread(broker, [&] {
-        return runCall(
-            broker, request.context,
-            [&](RequestScope& scope, const CMPIContext* context, const CMPIResult* result) {
-                return call(interface, request, scope, context, result);
-            },
-            rulesOf(broker.profile(), request.operation));
-    });
-}
-
-template <class Interface>
-RawAnswer runAsManager(Broker& broker, Interface* interface, const Request& request) {
-    return broker.profile().manager == Manager::standard ? run(broker, interface, request)
-                                                         : run(broker, interface, handedOver(request, broker));
-}
-
-}  // namespace
-
-RawAnswer runRequest(Broker& broker, CMPIInstanceMI* interface, const Request& request) {
-    if (isAssociationOperation(request.operation)) {
+ProviderResponse runRequest(Broker& broker, CMPIInstanceMI* interface, Request request,
+                            const ManagerBehaviour& behaviour) {
+    if (request.operation > Operation::execQuery) {
         wrongInterface(request.operation);
     }
-    return runAsManager(broker, interface, request);
+    return run(broker, interface, std::move(request), behaviour);
 }
 
-RawAnswer runRequest(Broker& broker, CMPIAssociationMI* interface, const Request& request) {
+ProviderResponse runRequest(Broker& broker, CMPIAssociationMI* interface, Request request,
+                            const ManagerBehaviour& behaviour) {
     if (!isAssociationOperation(request.operation)) {
         wrongInterface(request.operation);
     }
-    return runAsManager(broker, interface, request);
+    return run(broker, interface, std::move(request), behaviour);
 }
 
 }  // namespace cimhost

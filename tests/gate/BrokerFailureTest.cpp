@@ -240,7 +240,7 @@ TEST_F(BrokerFailureTest, NoExceptionOfAnyKindLeavesAndTheNextRequestIsServed) {
 TEST_F(BrokerFailureTest, LooseBrokersServe) {
     for (const auto manager : {testsupport::Manager::sfcb, testsupport::Manager::openPegasus}) {
         testsupport::RecordingBroker loose;
-        loose.poseAs(manager);
+        loose.emulate(manager);
         loose.serve("VELKO_ComputerSystem", {testsupport::instance(computerPath("beta"))});
         gate().createInstanceMI(loose.handle(), nullptr);
         gate().createAssociationMI(loose.handle(), nullptr);

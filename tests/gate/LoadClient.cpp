@@ -6,6 +6,8 @@ namespace gatetest {
 
 namespace {
 
+using cimhost::Request;
+
 using testsupport::Form;
 using testsupport::ModelRecord;
 using testsupport::RecordModel;
@@ -124,9 +126,9 @@ void LoadClient::create(const LoadedKind& kind, const std::string& id, int value
 }
 
 void LoadClient::read(const LoadedKind& kind, const std::string& id) {
-    const auto answer = gate.manager().getInstance({}, keyedPath(kind.className, id), {});
+    const auto answer = gate.manager().perform(Request::getInstance(keyedPath(kind.className, id)));
     expect(answer.ok(), "getting " + id, answer.status);
-    expect(shows(kind, answer.value, told.records[kind.className][id]), "the values of " + id);
+    expect(shows(kind, answer.instance(), told.records[kind.className][id]), "the values of " + id);
 }
 
 void LoadClient::modify(const LoadedKind& kind, const std::string& id, int value) {
@@ -144,11 +146,11 @@ void LoadClient::remove(const LoadedKind& kind, const std::string& id) {
 
 /** Everything that is this client's own is there, once, and as it was told. */
 void LoadClient::enumerate(const LoadedKind& kind) {
-    const auto answer = gate.manager().enumerateInstances({}, classPath(kind.className), {});
+    const auto answer = gate.manager().perform(Request::enumerateInstances(classPath(kind.className)));
     expect(answer.ok(), "enumerating", answer.status);
     const Told::Records& own = told.records[kind.className];
     std::set<std::string> seen;
-    for (const Instance& instance : answer.value) {
+    for (const Instance& instance : answer.instances) {
         const std::string id = valueIn(instance, "InstanceID").value_or("(none)");
         expect(seen.insert(id).second, id + " is there twice");
         const auto found = own.find(id);
@@ -176,17 +178,20 @@ void LoadClient::move(const LoadedKind& kind, int round) {
 
 void LoadClient::expectBelongings(const LoadedKind& kind, const char* computer,
                                   const std::vector<std::string>& identifiers) {
-    const auto names = gate.manager().associatorNames({}, computerPath(computer), {kind.setting, {}, {}, {}});
-    expect(names.ok() && identifiersOf(names.value) == identifiers, std::string("what belongs to ") + computer,
+    const auto names =
+        gate.manager().perform(Request::associatorNames(computerPath(computer), {kind.setting, {}, {}, {}}));
+    expect(names.ok() && identifiersOf(names.paths) == identifiers, std::string("what belongs to ") + computer,
            names.status);
-    const auto references = gate.manager().referenceNames({}, computerPath(computer), {{}, kind.setting, {}, {}});
-    expect(references.ok() && references.value.size() == identifiers.size(), std::string("references of ") + computer,
+    const auto references =
+        gate.manager().perform(Request::referenceNames(computerPath(computer), {{}, kind.setting, {}, {}}));
+    expect(references.ok() && references.paths.size() == identifiers.size(), std::string("references of ") + computer,
            references.status);
 }
 
 void LoadClient::expectComputer(const LoadedKind& kind, const char* place, const std::string& computer) {
-    const auto found = gate.manager().associators({}, keyedPath(kind.className, place), {kind.setting, {}, {}, {}}, {});
-    const bool isIt = found.value.size() == 1 && valueIn(found.value.front(), "Name") == computer;
+    const auto found =
+        gate.manager().perform(Request::associators(keyedPath(kind.className, place), {kind.setting, {}, {}, {}}));
+    const bool isIt = found.instances.size() == 1 && valueIn(found.instance(), "Name") == computer;
     expect(found.ok() && isIt, std::string("the computer of ") + place, found.status);
 }
 
@@ -200,8 +205,9 @@ void LoadClient::changeAsset(int round) {
     const auto status = gate.modify(assetPath(), {named(property, text(value))});
     expect(status.ok(), std::string("changing ") + property, status);
     told.asset[property] = value;
-    const auto answer = gate.manager().getInstance({}, assetPath(), {});
-    expect(answer.ok() && valueIn(answer.value, property) == value, std::string("reading ") + property, answer.status);
+    const auto answer = gate.manager().perform(Request::getInstance(assetPath()));
+    expect(answer.ok() && valueIn(answer.instance(), property) == value, std::string("reading ") + property,
+           answer.status);
 }
 
 }  // namespace gatetest

@@ -3,15 +3,15 @@
 
 #include "LoadClient.h"
 #include "Threads.h"
+#include "lab/emulation/ManagerEmulation.h"
 #include "support/Files.h"
-#include "support/Managers.h"
 
 // Many clients at a time: what they were told, what the tables hold and what the files hold are the same.
 
 namespace gatetest {
 namespace {
 
-using cimhost::Manager;
+using cimhost::lab::Manager;
 using testing::IsEmpty;
 using testing::UnorderedElementsAreArray;
 using testsupport::RecordModel;
@@ -29,10 +29,10 @@ RecordModel modelOf(const LoadedKind& kind, const Told& told) {
 
 /** What the instances of a class show. */
 std::vector<std::vector<std::string>> inTable(ManagedGate& gate, const LoadedKind& kind) {
-    const auto answer = gate.manager().enumerateInstances({}, classPath(kind.className), {});
+    const auto answer = gate.manager().perform(cimhost::Request::enumerateInstances(classPath(kind.className)));
     EXPECT_TRUE(answer.ok()) << answer.status.message;
     std::vector<std::vector<std::string>> shown;
-    for (const Instance& instance : answer.value) {
+    for (const Instance& instance : answer.instances) {
         shown.push_back(RecordModel(kind.fields).shownFields(instance));
     }
     return shown;
@@ -138,7 +138,7 @@ TEST_P(LoadTest, ClientsTablesAndFilesAgreeAfterAMixedLoad) {
     expectAgreement(again, told);
 }
 
-INSTANTIATE_TEST_SUITE_P(Gate, LoadTest, testing::ValuesIn(testsupport::everyManager), testsupport::ManagerName());
+INSTANTIATE_TEST_SUITE_P(Gate, LoadTest, testing::ValuesIn(cimhost::lab::everyManager), cimhost::lab::ManagerName());
 
 }  // namespace
 }  // namespace gatetest

@@ -1,7 +1,5 @@
 #include "ManagedGate.h"
 
-#include "operations/ClassShapes.h"
-#include "operations/Interpretation.h"
 #include "schema/MofReader.h"
 #include "support/Files.h"
 #include "support/UnderTest.h"
@@ -12,17 +10,19 @@ namespace gatetest {
 
 namespace {
 
+using cimhost::Request;
+
 std::filesystem::path configuration() {
     return agentEnvironment::directory() / "agent.toml";
 }
 
-cimhost::ObjectManagerOptions optionsOf(cimhost::Manager manager) {
+cimhost::ObjectManagerOptions optionsOf(cimhost::lab::Manager manager) {
     cimhost::Schema schema;
     cimhost::MofReader(schema).readFile(SCHEMA_MOF);
     cimhost::ObjectManagerOptions options;
     options.libraries.searchPath = {std::filesystem::path(testsupport::underTest(GATE_LIBRARY)).parent_path()};
-    options.classShape = cimhost::classShapes(schema);
-    options.manager = manager;
+    options.classInfo = cimhost::classInfos(schema);
+    options.behaviour = cimhost::lab::emulationOf(manager);
     return options;
 }
 
@@ -38,7 +38,7 @@ cimhost::ProviderRegistry registryOf(std::initializer_list<const char*> files) {
 
 }  // namespace
 
-ManagedGate::ManagedGate(cimhost::Manager manager, Served served)
+ManagedGate::ManagedGate(cimhost::lab::Manager manager, Served served)
     : host(std::make_unique<cimhost::ObjectManager>(
           optionsOf(manager),
           registryOf({served == Served::byGate ? GATE_REGISTRATION : PROVIDER_REGISTRATION, COMPUTER_REGISTRATION}))) {}
@@ -48,28 +48,22 @@ std::vector<std::string> ManagedGate::identifiers(const std::string& className) 
 }
 
 std::vector<ObjectPath> ManagedGate::paths(const std::string& className) {
-    auto answer = host->enumerateInstanceNames({}, classPath(className));
+    auto answer = host->perform(Request::enumerateInstanceNames(classPath(className)));
     EXPECT_TRUE(answer.ok()) << answer.status.message;
-    return answer.value;
+    return answer.paths;
 }
 
 Instance ManagedGate::got(const ObjectPath& path) {
-    auto answer = host->getInstance({}, path, {});
+    auto answer = host->perform(Request::getInstance(path));
     EXPECT_TRUE(answer.ok()) << answer.status.message;
-    return answer.value;
+    return answer.instance();
 }
 
 cimhost::Status ManagedGate::ask(const cimhost::Request& request) {
-    const auto answers = host->run(request);
-    cimhost::Status status = cimhost::statusOf(answers, request.operation);
-    if (request.operation == cimhost::Operation::getInstance) {
-        status = cimhost::oneInstance(answers, request.path).status;
-    } else if (request.operation == cimhost::Operation::createInstance) {
-        status = cimhost::createdPath(answers).status;
-    }
-    status.message.clear();
-    for (const cimhost::RawAnswer& answer : answers.value) {
-        status.message += answer.status.message;
+    const cimhost::Response response = host->perform(request);
+    cimhost::Status status{response.status.rc};
+    for (const cimhost::ProviderResponse& each : response.providers) {
+        status.message += each.status.message;
     }
     return status;
 }
@@ -77,15 +71,15 @@ cimhost::Status ManagedGate::ask(const cimhost::Request& request) {
 cimhost::Status ManagedGate::create(const std::string& id, std::vector<NamedValue> properties, const std::string& of) {
     const ObjectPath path = keyedPath(of, id);
     properties.push_back(named("InstanceID", text(id)));
-    return ask({cimhost::Operation::createInstance, path, {}, {path, std::move(properties)}});
+    return ask(Request::createInstance(path, {path, std::move(properties)}));
 }
 
 cimhost::Status ManagedGate::modify(const ObjectPath& path, std::vector<NamedValue> properties) {
-    return ask({cimhost::Operation::modifyInstance, path, {}, {path, std::move(properties)}});
+    return ask(Request::modifyInstance(path, {path, std::move(properties)}));
 }
 
 cimhost::Status ManagedGate::remove(const std::string& id, const std::string& of) {
-    return ask({cimhost::Operation::deleteInstance, keyedPath(of, id)});
+    return ask(Request::deleteInstance(keyedPath(of, id)));
 }
 
 SilentLog::SilentLog() : before(testsupport::readFile(configuration())) {

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "GateFixture.h"
+#include "lab/emulation/ManagerEmulation.h"
 #include "operations/ObjectManager.h"
 
 namespace gatetest {
@@ -9,12 +10,12 @@ namespace gatetest {
 enum class Served { byGate, byProvider };
 
 /**
- * An object manager that plays another one, with the gate (or the provider itself) and the provider of the computer
+ * An object manager that emulates another one, with the gate (or the provider itself) and the provider of the computer
  * systems registered, over the classes of the schema. Its end closes the libraries.
  */
 class ManagedGate {
 public:
-    explicit ManagedGate(cimhost::Manager manager, Served served = Served::byGate);
+    explicit ManagedGate(cimhost::lab::Manager manager, Served served = Served::byGate);
 
     cimhost::ObjectManager& manager() { return *host; }
 

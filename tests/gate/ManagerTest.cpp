@@ -1,5 +1,5 @@
 #include "ManagedGate.h"
-#include "support/Managers.h"
+#include "lab/emulation/ManagerEmulation.h"
 #include "support/UnderTest.h"
 
 // Whole lives of instances, under object managers as they are.
@@ -7,7 +7,8 @@
 namespace gatetest {
 namespace {
 
-using cimhost::Manager;
+using cimhost::Request;
+using cimhost::lab::Manager;
 using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
@@ -42,7 +43,7 @@ TEST_P(ManagerTest, LeasesAndWarrantiesAreCreatedReadChangedAndDeleted) {
         expectStatus(gate.modify(path, {named("ElementName", text("x"))}), CMPI_RC_ERR_INVALID_PARAMETER);
         expectStatus(gate.remove("A1", of), CMPI_RC_OK);
         EXPECT_THAT(gate.identifiers(of), ElementsAre("A2"));
-        EXPECT_THAT(gate.manager().enumerateInstances({}, classPath(of), {}).value, SizeIs(1));
+        EXPECT_THAT(gate.manager().perform(Request::enumerateInstances(classPath(of))).instances, SizeIs(1));
         expectStatus(gate.remove("A1", of), CMPI_RC_ERR_NOT_FOUND);
         expectStatus(gate.modify(path, {named(property, text("x"))}), CMPI_RC_ERR_NOT_FOUND);
         expectStatus(gate.ask({cimhost::Operation::getInstance, path}), CMPI_RC_ERR_NOT_FOUND);
@@ -68,7 +69,7 @@ TEST_P(ManagerTest, TheAgentIsReadAndCannotBeChanged) {
     const auto paths = gate.paths(agent);
     ASSERT_THAT(paths, SizeIs(1));
     EXPECT_EQ(valueIn(gate.got(paths.front()), "Version"), "4.2.0");
-    EXPECT_THAT(gate.manager().enumerateInstances({}, classPath(agent), {}).value, SizeIs(1));
+    EXPECT_THAT(gate.manager().perform(Request::enumerateInstances(classPath(agent))).instances, SizeIs(1));
     expectStatus(gate.modify(paths.front(), {}), CMPI_RC_ERR_NOT_SUPPORTED);
 }
 
@@ -94,21 +95,22 @@ TEST_P(ManagerTest, AssociationsTellTheSameFromAllSides) {
     const auto leases = gate.paths(leaseSetting);
     ASSERT_THAT(leases, SizeIs(2));
     EXPECT_THAT(gate.paths(warrantySetting), SizeIs(1));
-    EXPECT_THAT(gate.manager().enumerateInstances({}, classPath(leaseSetting), {}).value, SizeIs(2));
+    EXPECT_THAT(gate.manager().perform(Request::enumerateInstances(classPath(leaseSetting))).instances, SizeIs(2));
     EXPECT_THAT(gate.got(leases.front()).properties, SizeIs(2));
     const cimhost::AssociationFilter byLease{leaseSetting, {}, {}, {}};
     const cimhost::AssociationFilter resultLease{{}, leaseSetting, {}, {}};
     const ObjectPath beta = computerPath("beta");
-    EXPECT_THAT(identifiersOf(gate.manager().associatorNames({}, beta, byLease).value), ElementsAre(secondPlace));
-    EXPECT_THAT(gate.manager().associators({}, beta, byLease, {}).value, SizeIs(1));
-    EXPECT_THAT(gate.manager().references({}, beta, resultLease, {}).value, SizeIs(1));
-    EXPECT_THAT(gate.manager().referenceNames({}, beta, resultLease).value, SizeIs(1));
+    EXPECT_THAT(identifiersOf(gate.manager().perform(Request::associatorNames(beta, byLease)).paths),
+                ElementsAre(secondPlace));
+    EXPECT_THAT(gate.manager().perform(Request::associators(beta, byLease)).instances, SizeIs(1));
+    EXPECT_THAT(gate.manager().perform(Request::references(beta, resultLease)).instances, SizeIs(1));
+    EXPECT_THAT(gate.manager().perform(Request::referenceNames(beta, resultLease)).paths, SizeIs(1));
     const ObjectPath element = keyedPath(lease, secondPlace);
-    EXPECT_THAT(shownPaths(gate.manager().associatorNames({}, element, byLease).value),
+    EXPECT_THAT(shownPaths(gate.manager().perform(Request::associatorNames(element, byLease)).paths),
                 ElementsAre("root/cimv2:VELKO_ComputerSystem.Name=\"beta\""));
-    EXPECT_THAT(gate.manager().associators({}, element, byLease, {}).value, SizeIs(1));
-    EXPECT_THAT(gate.manager().references({}, element, resultLease, {}).value, SizeIs(1));
-    EXPECT_THAT(gate.manager().referenceNames({}, element, resultLease).value, SizeIs(1));
+    EXPECT_THAT(gate.manager().perform(Request::associators(element, byLease)).instances, SizeIs(1));
+    EXPECT_THAT(gate.manager().perform(Request::references(element, resultLease)).instances, SizeIs(1));
+    EXPECT_THAT(gate.manager().perform(Request::referenceNames(element, resultLease)).paths, SizeIs(1));
 }
 
 TEST_P(ManagerTest, WhatTheDataFileWouldLoseIsRefused) {
@@ -119,7 +121,7 @@ TEST_P(ManagerTest, WhatTheDataFileWouldLoseIsRefused) {
     EXPECT_THAT(gate.identifiers(lease), IsEmpty());
 }
 
-INSTANTIATE_TEST_SUITE_P(Gate, ManagerTest, testing::ValuesIn(testsupport::everyManager), testsupport::ManagerName());
+INSTANTIATE_TEST_SUITE_P(Gate, ManagerTest, testing::ValuesIn(cimhost::lab::everyManager), cimhost::lab::ManagerName());
 
 }  // namespace
 }  // namespace gatetest

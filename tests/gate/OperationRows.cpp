@@ -6,9 +6,9 @@ namespace gatetest {
 
 namespace {
 
-using cimhost::Manager;
 using cimhost::Operation;
 using cimhost::Request;
+using cimhost::lab::Manager;
 using Rows = std::vector<Row>;
 using Values = std::vector<NamedValue>;
 

@@ -4,7 +4,8 @@
 #include <vector>
 
 #include "GateFixture.h"
-#include "operations/Request.h"
+#include "lab/emulation/ManagerEmulation.h"
+#include "model/Request.h"
 
 // Every operation of every class: requests, and what is answered to them.
 
@@ -17,7 +18,7 @@ struct Bare {
     std::string pegasus;
     std::string emptyKey;  ///< under the manager whose new instances have an empty key in their path
 
-    const std::string& under(cimhost::Manager manager) const;
+    const std::string& under(cimhost::lab::Manager manager) const;
 };
 
 /**

@@ -1,15 +1,15 @@
 #include "ManagedGate.h"
 #include "OperationRows.h"
 #include "Shown.h"
-#include "support/Managers.h"
+#include "lab/emulation/ManagerEmulation.h"
 
 // Every operation of every class under every object manager: through the gate, and from the provider itself.
 
 namespace gatetest {
 namespace {
 
-using cimhost::Manager;
-using cimhost::RawAnswer;
+using cimhost::ProviderResponse;
+using cimhost::lab::Manager;
 using testing::IsEmpty;
 using testing::Not;
 
@@ -19,14 +19,14 @@ protected:
     ~OperationTest() override { agentEnvironment::clear(); }
 
     /** Who serves the classes starts anew with each request, over the same files. */
-    cimhost::Answer<std::vector<RawAnswer>> ask(const Row& row, Served served) {
+    cimhost::Response ask(const Row& row, Served served) {
         agentEnvironment::clear();
         writeRecords(recordsOfRows());
         const DataFiles before;
         ManagedGate gate(GetParam(), served);
-        auto answers = gate.manager().run(row.request);
-        got = shown(answers, row.request) + before.changes();
-        return answers;
+        cimhost::Response response = gate.manager().perform(row.request);
+        got = shown(response) + before.changes();
+        return response;
     }
 
     std::string got;  ///< what the client got, and what became of the files
@@ -44,7 +44,7 @@ std::vector<Row> rowsOf(Manager manager) {
 }
 
 /** A failure has a message of the provider's own and no answers; whatever else, none. */
-void expectStandardForm(const RawAnswer& answer) {
+void expectStandardForm(const ProviderResponse& answer) {
     EXPECT_FALSE(answer.threw);
     if (answer.status.ok()) {
         EXPECT_FALSE(answer.hasMessage) << answer.status.message;
@@ -57,10 +57,10 @@ void expectStandardForm(const RawAnswer& answer) {
 TEST_P(OperationTest, ThroughTheGateEveryOperationIsAnsweredAsTheStandardPromises) {
     for (const Row& row : rowsOf(GetParam())) {
         SCOPED_TRACE(row.name);
-        const auto answers = ask(row, Served::byGate);
+        const cimhost::Response response = ask(row, Served::byGate);
         EXPECT_EQ(got, row.gate);
-        EXPECT_THAT(answers.value, Not(IsEmpty()));
-        for (const RawAnswer& answer : answers.value) {
+        EXPECT_THAT(response.providers, Not(IsEmpty()));
+        for (const ProviderResponse& answer : response.providers) {
             expectStandardForm(answer);
         }
     }
@@ -69,9 +69,9 @@ TEST_P(OperationTest, ThroughTheGateEveryOperationIsAnsweredAsTheStandardPromise
 TEST_P(OperationTest, TheProviderItselfAnswersAsItAlwaysDid) {
     for (const Row& row : rowsOf(GetParam())) {
         SCOPED_TRACE(row.name);
-        const auto answers = ask(row, Served::byProvider);
+        const cimhost::Response response = ask(row, Served::byProvider);
         EXPECT_EQ(got, row.bare.under(GetParam()));
-        for (const RawAnswer& answer : answers.value) {
+        for (const ProviderResponse& answer : response.providers) {
             EXPECT_FALSE(answer.threw);
             EXPECT_FALSE(answer.hasMessage) << answer.status.message;
         }
@@ -103,8 +103,8 @@ TEST(EmptyKeyTest, WithoutItAnEmptyIdentifierShiftsTheRecordsThatFollow) {
     agentEnvironment::clear();
 }
 
-INSTANTIATE_TEST_SUITE_P(Managers, OperationTest, testing::ValuesIn(testsupport::everyManager),
-                         testsupport::ManagerName());
+INSTANTIATE_TEST_SUITE_P(Managers, OperationTest, testing::ValuesIn(cimhost::lab::everyManager),
+                         cimhost::lab::ManagerName());
 
 }  // namespace
 }  // namespace gatetest

@@ -1,14 +1,13 @@
 #include "ManagedGate.h"
-#include "operations/Interpretation.h"
-#include "support/Managers.h"
+#include "lab/emulation/ManagerEmulation.h"
 
 // Property lists under every object manager: what is listed goes out, and the keys.
 
 namespace gatetest {
 namespace {
 
-using cimhost::Manager;
 using cimhost::Operation;
+using cimhost::lab::Manager;
 using testing::UnorderedElementsAreArray;
 
 using Names = std::vector<std::string>;
@@ -66,9 +65,9 @@ protected:
         request.properties = row.list;
         const bool refers = row.operation == Operation::references;
         (refers ? request.filter.resultClass : request.filter.associationClass) = row.associationClass;
-        const auto found = cimhost::resultsOf<Instance>(gate.manager().run(request), row.operation);
+        const cimhost::Response found = gate.manager().perform(request);
         EXPECT_TRUE(found.ok()) << found.status.message;
-        return found.value;
+        return found.instances;
     }
 
     SilentLog silence;
@@ -86,8 +85,8 @@ TEST_P(PropertyListTest, AnswersHaveTheListedPropertiesAndTheKeys) {
     }
 }
 
-INSTANTIATE_TEST_SUITE_P(Managers, PropertyListTest, testing::ValuesIn(testsupport::everyManager),
-                         testsupport::ManagerName());
+INSTANTIATE_TEST_SUITE_P(Managers, PropertyListTest, testing::ValuesIn(cimhost::lab::everyManager),
+                         cimhost::lab::ManagerName());
 
 }  // namespace
 }  // namespace gatetest

@@ -6,14 +6,15 @@
 #include <mutex>
 #include <thread>
 
-#include "support/Managers.h"
+#include "lab/emulation/ManagerEmulation.h"
 
 // What a client has read and sends back, under object managers that change it on the way.
 
 namespace gatetest {
 namespace {
 
-using cimhost::Manager;
+using cimhost::Request;
+using cimhost::lab::Manager;
 using testing::UnorderedElementsAre;
 
 class RoundTripTest : public testing::TestWithParam<Manager> {
@@ -62,20 +63,21 @@ TEST_P(RoundTripTest, OfAssetDataChangesOnlyWhatIsChanged) {
 
 TEST_P(RoundTripTest, PropertyListsHoldForReadingAndForChanging) {
     const ObjectPath path = keyedPath(lease, "L1");
-    const auto got = gate.manager().getInstance({}, path, {{"lessor"}});
+    const auto got = gate.manager().perform(Request::getInstance(path, {{"lessor"}}));
     ASSERT_TRUE(got.ok()) << got.status.message;
-    EXPECT_THAT(testsupport::namesOf(got.value.properties), UnorderedElementsAre("InstanceID", "Lessor"));
-    const auto listed = gate.manager().enumerateInstances({}, classPath(lease), {{"LeaseTerm"}});
-    ASSERT_EQ(listed.value.size(), 1U) << listed.status.message;
-    EXPECT_THAT(testsupport::namesOf(listed.value.front().properties), UnorderedElementsAre("InstanceID", "LeaseTerm"));
+    EXPECT_THAT(testsupport::namesOf(got.instance().properties), UnorderedElementsAre("InstanceID", "Lessor"));
+    const auto listed = gate.manager().perform(Request::enumerateInstances(classPath(lease), {{"LeaseTerm"}}));
+    ASSERT_EQ(listed.instances.size(), 1U) << listed.status.message;
+    EXPECT_THAT(testsupport::namesOf(listed.instance().properties), UnorderedElementsAre("InstanceID", "LeaseTerm"));
     const Instance sent =
         testsupport::instance(path, {named("LeaseTerm", uint32(9)), named("FairMarketValue", text("not listed"))});
-    EXPECT_TRUE(gate.manager().modifyInstance({}, path, sent, {{"LeaseTerm"}}).ok());
+    EXPECT_TRUE(gate.manager().perform(Request::modifyInstance(path, sent, {{"LeaseTerm"}})).ok());
     EXPECT_EQ(valueIn(gate.got(path), "LeaseTerm"), "9");
     EXPECT_EQ(valueIn(gate.got(path), "FairMarketValue"), "");
 }
 
-INSTANTIATE_TEST_SUITE_P(Gate, RoundTripTest, testing::ValuesIn(testsupport::everyManager), testsupport::ManagerName());
+INSTANTIATE_TEST_SUITE_P(Gate, RoundTripTest, testing::ValuesIn(cimhost::lab::everyManager),
+                         cimhost::lab::ManagerName());
 
 /** A result that takes the first instance and then waits, as for a client that reads slowly. */
 class SlowReader {

@@ -3,7 +3,6 @@
 #include <algorithm>
 #include <sstream>
 
-#include "operations/Interpretation.h"
 #include "schema/MofWriter.h"
 #include "support/Files.h"
 
@@ -11,9 +10,7 @@ namespace gatetest {
 
 namespace {
 
-using cimhost::Operation;
-using cimhost::RawAnswer;
-using Answers = cimhost::Answer<std::vector<RawAnswer>>;
+using cimhost::ProviderResponse;
 
 struct RecordFile {
     const char* name;
@@ -44,44 +41,18 @@ std::string shown(const cimhost::Value& value) {
     return cimhost::formatMof(value);
 }
 
-std::vector<ObjectPath> pathsOf(const std::vector<Instance>& instances) {
-    std::vector<ObjectPath> paths;
-    for (const Instance& instance : instances) {
+/** The paths of the results, whatever their kind. */
+std::vector<ObjectPath> pathsOf(const cimhost::Response& response) {
+    std::vector<ObjectPath> paths = response.paths;
+    for (const Instance& instance : response.instances) {
         paths.push_back(instance.path);
     }
     return paths;
 }
 
-template <class Value>
-cimhost::Answer<std::vector<ObjectPath>> oneOf(cimhost::Answer<Value> answer, ObjectPath path) {
-    return {std::move(answer.status), {std::move(path)}};
-}
-
-/** What the client gets, whatever the operation. */
-cimhost::Answer<std::vector<ObjectPath>> toClient(const Answers& answers, const cimhost::Request& request) {
-    switch (request.operation) {
-        case Operation::getInstance: {
-            const auto found = cimhost::oneInstance(answers, request.path);
-            return oneOf(found, found.value.path);
-        }
-        case Operation::createInstance: {
-            const auto made = cimhost::createdPath(answers);
-            return oneOf(made, made.value);
-        }
-        case Operation::enumerateInstances:
-        case Operation::associators:
-        case Operation::references: {
-            const auto found = cimhost::resultsOf<Instance>(answers, request.operation);
-            return {found.status, pathsOf(found.value)};
-        }
-        default:
-            return cimhost::resultsOf<ObjectPath>(answers, request.operation);
-    }
-}
-
-bool isProvidersFailure(const Answers& answers) {
-    return std::any_of(answers.value.begin(), answers.value.end(),
-                       [](const RawAnswer& each) { return !each.status.ok(); });
+bool isProvidersFailure(const cimhost::Response& response) {
+    return std::any_of(response.providers.begin(), response.providers.end(),
+                       [](const ProviderResponse& each) { return !each.status.ok(); });
 }
 
 /** The records of a file: identifier and first text, blanks for underscores, whatever the number of lines says. */
@@ -115,17 +86,15 @@ std::string shown(const ObjectPath& path) {
     return text + "]";
 }
 
-std::string shown(const Answers& answers, const cimhost::Request& request) {
-    const auto isFatal = [&](const RawAnswer& each) { return !cimhost::fatality(each, request.operation).empty(); };
-    if (std::any_of(answers.value.begin(), answers.value.end(), isFatal)) {
+std::string shown(const cimhost::Response& response) {
+    if (!response.crashReason().empty()) {
         return "died";
     }
-    const auto got = toClient(answers, request);
-    if (!got.ok()) {
-        return (isProvidersFailure(answers) ? "error " : "manager's error ") + std::to_string(got.status.rc);
+    if (!response.ok()) {
+        return (isProvidersFailure(response) ? "error " : "manager's error ") + std::to_string(response.status.rc);
     }
     std::string text;
-    for (const ObjectPath& path : got.value) {
+    for (const ObjectPath& path : pathsOf(response)) {
         text += (text.empty() ? "" : " ") + shown(path);
     }
     return text;

@@ -3,7 +3,7 @@
 #include <string>
 
 #include "GateFixture.h"
-#include "operations/Request.h"
+#include "model/Response.h"
 
 // Answers, paths and data files in few words, for tables of what is expected.
 
@@ -16,7 +16,7 @@ std::string shown(const ObjectPath& path);
  * What a client gets: the paths of what was answered, blanks between them; "error 6" where the provider answered it,
  * "manager's error 6" where the object manager made it of a success, "died" where its process would have ended.
  */
-std::string shown(const cimhost::Answer<std::vector<cimhost::RawAnswer>>& answers, const cimhost::Request& request);
+std::string shown(const cimhost::Response& response);
 
 /** The data files of the agent as the provider writes them, to be compared with what they are later. */
 class DataFiles {

@@ -21,7 +21,8 @@ class Block:
 
 
 def all_documents():
-    return [ROOT / "README.md", ROOT / "CONTRIBUTING.md", *sorted((ROOT / "docs").rglob("*.md"))]
+    return [ROOT / "README.md", ROOT / "CONTRIBUTING.md", *sorted((ROOT / "docs").rglob("*.md")),
+            ROOT / "tests" / "lab" / "README.md"]
 
 
 def blocks(document):

@@ -1,4 +1,4 @@
-"""A stand-in for an object manager: cimhost performs each request, with the gate or without it, as SFCB would.
+"""A stand-in for an object manager: cimhost-lab performs each request, with the gate or without it, as SFCB would.
 
 Answers CIM-XML over HTTP, as far as the clients in the documents need it; and, in the module pywbem of stand-ins/, the
 calls that a Python client makes.
@@ -7,6 +7,7 @@ calls that a Python client makes.
 import contextlib
 import http.server
 import json
+import os
 import re
 import subprocess
 import threading
@@ -26,14 +27,18 @@ def quoted(text):
 
 class Manager:
     """@param build      directory with bin/ and share/
-    @param environment  of cimhost
+    @param environment  of cimhost-lab
     @param provider     "gate", or "bare" for the provider without it"""
 
     def __init__(self, build, environment, provider="gate"):
         data = build / "share" / "lease-warranty-provider"
         registration = {"gate": "gate/LeaseAndWarrantyGate.reg", "bare": "LeaseAndWarrantyProvider.reg"}[provider]
-        self.command = [str(build / "bin" / "cimhost"), "--as", "sfcb", "--format", "json", "--registration",
-                        str(data / registration), "--registration", str(data / "OstrelComputerSystemProvider.reg")]
+        name = "libLeaseAndWarrantyGate.so"
+        libraries = next(path.parent for path in sorted((build / "lib").glob(f"**/{name}")))
+        program = os.environ.get("CIMHOST_LAB", build / "bin" / "cimhost-lab")  # an installation has none
+        self.command = [str(program), "--as", "sfcb", "--format", "json", "--schema", str(data / "velko.mof"),
+                        "--library-path", str(libraries), "--registration", str(data / registration),
+                        "--registration", str(data / "OstrelComputerSystemProvider.reg")]
         self.environment = environment
         self.asked = []  # the operations, in their order
 
@@ -42,7 +47,7 @@ class Manager:
         ended = subprocess.run([*self.command, command, *arguments], stdout=subprocess.PIPE, stderr=subprocess.PIPE,
                                text=True, env=self.environment)
         if ended.returncode != 0:
-            code = re.match(r"cimhost: error (\d+) \(\w+\): (.*)", ended.stderr, re.S)
+            code = re.match(r"cimhost-lab: error (\d+) \(\w+\): (.*)", ended.stderr, re.S)
             wrong_usage = "4" if ended.returncode == 2 else "1"
             raise CimError(code[1] if code else wrong_usage, code[2] if code else ended.stderr)
         return json.loads(ended.stdout) if ended.stdout else None
@@ -62,7 +67,7 @@ def path_of(element):
 
 
 def values_of(element):
-    """The values of an INSTANCE, as cimhost takes them."""
+    """The values of an INSTANCE, as cimhost-lab takes them."""
     return [f'{each.get("NAME")}={each.findtext("VALUE") or ""}' for each in element.findall("PROPERTY")
             if each.find("VALUE") is not None]
 

@@ -1,7 +1,7 @@
 #include "support/Describe.h"
 
-#include "broker/Boundary.h"
 #include "broker/Convert.h"
+#include "broker/ErrorTranslation.h"
 #include "schema/MofWriter.h"
 #include "schema/ObjectPathText.h"
 

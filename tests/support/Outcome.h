@@ -6,8 +6,7 @@
 #include <utility>
 #include <vector>
 
-#include "model/ResultEvent.h"
-#include "operations/Request.h"
+#include "model/Response.h"
 
 namespace testsupport {
 
@@ -24,10 +23,10 @@ struct Outcome {
     std::vector<cimhost::ObjectPath> paths() const { return cimhost::eventsOf<cimhost::ObjectPath>(events); }
 };
 
-inline Outcome outcomeOf(cimhost::RawAnswer answer) {
-    const int done = answer.doneCount();
-    return {answer.status.rc, answer.hasMessage,        std::move(answer.status.message),
-            answer.threw,     std::move(answer.events), done};
+inline Outcome outcomeOf(cimhost::ProviderResponse response) {
+    const int done = response.doneCount();
+    return {response.status.rc, response.hasMessage,        std::move(response.status.message),
+            response.threw,     std::move(response.events), done};
 }
 
 }  // namespace testsupport

@@ -1,12 +1,11 @@
 #include "support/ProviderLibrary.h"
 
-#include "operations/LibraryError.h"
+#include "operations/LoadedLibrary.h"
 #include "support/Values.h"
 
 namespace testsupport {
 namespace {
 
-using cimhost::Operation;
 using cimhost::Request;
 
 template <class Interface>
@@ -47,66 +46,11 @@ CMPIAssociationMI* ProviderLibrary::associationMI() {
     return associations == nullptr ? createAssociationMI(broker.handle(), &status) : associations;
 }
 
-Outcome ProviderLibrary::runInstance(Request request) {
+Outcome ProviderLibrary::perform(Request request) {
     request.context = context;
-    return outcomeOf(runRequest(broker.broker(), instanceMI(), request));
-}
-
-Outcome ProviderLibrary::runAssociation(Request request) {
-    request.context = context;
-    return outcomeOf(runRequest(broker.broker(), associationMI(), request));
-}
-
-Outcome ProviderLibrary::enumerateInstances(const cimhost::ObjectPath& path, const cimhost::PropertyList& properties) {
-    return runInstance({Operation::enumerateInstances, path, properties, {}, {}, {}});
-}
-
-Outcome ProviderLibrary::enumerateInstanceNames(const cimhost::ObjectPath& path) {
-    return runInstance({Operation::enumerateInstanceNames, path, {}, {}, {}, {}});
-}
-
-Outcome ProviderLibrary::getInstance(const cimhost::ObjectPath& path, const cimhost::PropertyList& properties) {
-    return runInstance({Operation::getInstance, path, properties, {}, {}, {}});
-}
-
-Outcome ProviderLibrary::createInstance(const cimhost::ObjectPath& path, const cimhost::Instance& instance) {
-    return runInstance({Operation::createInstance, path, {}, instance, {}, {}});
-}
-
-Outcome ProviderLibrary::modifyInstance(const cimhost::ObjectPath& path, const cimhost::Instance& instance,
-                                        const cimhost::PropertyList& properties) {
-    return runInstance({Operation::modifyInstance, path, properties, instance, {}, {}});
-}
-
-Outcome ProviderLibrary::deleteInstance(const cimhost::ObjectPath& path) {
-    return runInstance({Operation::deleteInstance, path, {}, {}, {}, {}});
-}
-
-Outcome ProviderLibrary::execQuery(const cimhost::ObjectPath& path, const std::string& language,
-                                   const std::string& query) {
-    CMPIInstanceMI* interface = instanceMI();
-    return call([&](cimhost::RequestScope& scope, const CMPIContext* itsContext, const CMPIResult* result) {
-        return interface->ft->execQuery(interface, itsContext, result, scope.objectPath(path), language.c_str(),
-                                        query.c_str());
-    });
-}
-
-Outcome ProviderLibrary::associators(const cimhost::ObjectPath& path, const cimhost::AssociationFilter& filter,
-                                     const cimhost::PropertyList& properties) {
-    return runAssociation({Operation::associators, path, properties, {}, filter, {}});
-}
-
-Outcome ProviderLibrary::associatorNames(const cimhost::ObjectPath& path, const cimhost::AssociationFilter& filter) {
-    return runAssociation({Operation::associatorNames, path, {}, {}, filter, {}});
-}
-
-Outcome ProviderLibrary::references(const cimhost::ObjectPath& path, const cimhost::AssociationFilter& filter,
-                                    const cimhost::PropertyList& properties) {
-    return runAssociation({Operation::references, path, properties, {}, filter, {}});
-}
-
-Outcome ProviderLibrary::referenceNames(const cimhost::ObjectPath& path, const cimhost::AssociationFilter& filter) {
-    return runAssociation({Operation::referenceNames, path, {}, {}, filter, {}});
+    return outcomeOf(cimhost::isAssociationOperation(request.operation)
+                         ? runRequest(broker.broker(), associationMI(), std::move(request))
+                         : runRequest(broker.broker(), instanceMI(), std::move(request)));
 }
 
 Outcome ProviderLibrary::cleanupInstanceMI(bool terminating) {

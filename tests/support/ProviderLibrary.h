@@ -6,7 +6,7 @@
 #include <string>
 #include <utility>
 
-#include "broker/UpCalls.h"
+#include "broker/Broker.h"
 #include "operations/LoadedLibrary.h"
 #include "operations/RequestRunner.h"
 #include "support/Outcome.h"
@@ -56,20 +56,41 @@ public:
 
     /** @name Operations */
     ///@{
-    Outcome enumerateInstances(const cimhost::ObjectPath& path, const cimhost::PropertyList& properties = {});
-    Outcome enumerateInstanceNames(const cimhost::ObjectPath& path);
-    Outcome getInstance(const cimhost::ObjectPath& path, const cimhost::PropertyList& properties = {});
-    Outcome createInstance(const cimhost::ObjectPath& path, const cimhost::Instance& instance);
+    Outcome perform(cimhost::Request request);
+    Outcome enumerateInstances(const cimhost::ObjectPath& path, const cimhost::PropertyList& properties = {}) {
+        return perform(cimhost::Request::enumerateInstances(path, properties));
+    }
+    Outcome enumerateInstanceNames(const cimhost::ObjectPath& path) {
+        return perform(cimhost::Request::enumerateInstanceNames(path));
+    }
+    Outcome getInstance(const cimhost::ObjectPath& path, const cimhost::PropertyList& properties = {}) {
+        return perform(cimhost::Request::getInstance(path, properties));
+    }
+    Outcome createInstance(const cimhost::ObjectPath& path, const cimhost::Instance& instance) {
+        return perform(cimhost::Request::createInstance(path, instance));
+    }
     Outcome modifyInstance(const cimhost::ObjectPath& path, const cimhost::Instance& instance,
-                           const cimhost::PropertyList& properties = {});
-    Outcome deleteInstance(const cimhost::ObjectPath& path);
-    Outcome execQuery(const cimhost::ObjectPath& path, const std::string& language, const std::string& query);
+                           const cimhost::PropertyList& properties = {}) {
+        return perform(cimhost::Request::modifyInstance(path, instance, properties));
+    }
+    Outcome deleteInstance(const cimhost::ObjectPath& path) { return perform(cimhost::Request::deleteInstance(path)); }
+    Outcome execQuery(const cimhost::ObjectPath& path, const std::string& language, const std::string& query) {
+        return perform(cimhost::Request::execQuery(path, language, query));
+    }
     Outcome associators(const cimhost::ObjectPath& path, const cimhost::AssociationFilter& filter,
-                        const cimhost::PropertyList& properties = {});
-    Outcome associatorNames(const cimhost::ObjectPath& path, const cimhost::AssociationFilter& filter);
+                        const cimhost::PropertyList& properties = {}) {
+        return perform(cimhost::Request::associators(path, filter, properties));
+    }
+    Outcome associatorNames(const cimhost::ObjectPath& path, const cimhost::AssociationFilter& filter) {
+        return perform(cimhost::Request::associatorNames(path, filter));
+    }
     Outcome references(const cimhost::ObjectPath& path, const cimhost::AssociationFilter& filter,
-                       const cimhost::PropertyList& properties = {});
-    Outcome referenceNames(const cimhost::ObjectPath& path, const cimhost::AssociationFilter& filter);
+                       const cimhost::PropertyList& properties = {}) {
+        return perform(cimhost::Request::references(path, filter, properties));
+    }
+    Outcome referenceNames(const cimhost::ObjectPath& path, const cimhost::AssociationFilter& filter) {
+        return perform(cimhost::Request::referenceNames(path, filter));
+    }
     Outcome cleanupInstanceMI(bool terminating);
     Outcome cleanupAssociationMI(bool terminating);
     ///@}
@@ -85,9 +106,6 @@ public:
     }
 
 private:
-    Outcome runInstance(cimhost::Request request);
-    Outcome runAssociation(cimhost::Request request);
-
     std::string name;
     RecordingBroker& broker;
     std::unique_ptr<cimhost::LoadedLibrary> library;

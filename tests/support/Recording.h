@@ -12,7 +12,7 @@
 #include <utility>
 #include <vector>
 
-#include "broker/Boundary.h"
+#include "broker/ErrorTranslation.h"
 #include "support/Describe.h"
 #include "support/RecordingBroker.h"
 

@@ -15,35 +15,30 @@ namespace {
 class ServedInstances : public cimhost::UpCalls {
 public:
     void serve(const std::string& className, std::vector<cimhost::Instance> instances) {
-        served[cimhost::foldedName(className)] = {{}, std::move(instances)};
+        cimhost::Response response = cimhost::Response::ofInstances(std::move(instances));
+        for (const cimhost::Instance& instance : response.instances) {
+            response.paths.push_back(instance.path);
+        }
+        served[cimhost::foldedName(className)] = std::move(response);
     }
 
     void fail(const std::string& className, CMPIrc rc) {
-        served[cimhost::foldedName(className)] = {{rc, "ordered to fail"}, {}};
+        served[cimhost::foldedName(className)] = cimhost::Response::failed({rc, "ordered to fail"});
     }
 
-    cimhost::Answer<std::vector<cimhost::Instance>> enumerateInstances(const cimhost::ContextEntries&,
-                                                                       const cimhost::ObjectPath& path,
-                                                                       const cimhost::PropertyList&) override {
-        const auto found = served.find(cimhost::foldedName(path.className));
+    cimhost::Response perform(cimhost::Request request) override {
+        const auto found = served.find(cimhost::foldedName(request.path.className));
+        if (request.operation > cimhost::Operation::enumerateInstanceNames) {
+            return cimhost::notSupported(request.operation);
+        }
         if (found == served.end()) {
-            return {{CMPI_RC_ERR_INVALID_CLASS, path.className + " is not served"}, {}};
+            return cimhost::Response::failed({CMPI_RC_ERR_INVALID_CLASS, request.path.className + " is not served"});
         }
         return found->second;
     }
 
-    cimhost::Answer<std::vector<cimhost::ObjectPath>> enumerateInstanceNames(const cimhost::ContextEntries& context,
-                                                                             const cimhost::ObjectPath& path) override {
-        const auto instances = enumerateInstances(context, path, {});
-        std::vector<cimhost::ObjectPath> paths;
-        for (const cimhost::Instance& instance : instances.value) {
-            paths.push_back(instance.path);
-        }
-        return {instances.status, std::move(paths)};
-    }
-
 private:
-    std::map<std::string, cimhost::Answer<std::vector<cimhost::Instance>>> served;
+    std::map<std::string, cimhost::Response> served;
 };
 
 }  // namespace
@@ -52,8 +47,8 @@ private:
 struct RecordingBroker::State {
     State()
         : tables(recordingTables()),
-          broker({[this](const std::string& name) { return shapes ? shapes(name) : nullptr; }, &upCalls, nullptr,
-                  &tables, Manager::standard}),
+          broker({[this](const std::string& name) { return classes ? classes(name) : nullptr; }, &upCalls, nullptr,
+                  &tables, true}),
           handle(*broker.handle()),
           objects(tables) {}
 
@@ -67,7 +62,7 @@ struct RecordingBroker::State {
 
     cimhost::FunctionTables tables;
     ServedInstances upCalls;
-    cimhost::ClassShapeLookup shapes;
+    cimhost::ClassInfoLookup classes;
     cimhost::Broker broker;
     CMPIBroker handle;
     cimhost::Arena objects;  ///< made for the test
@@ -195,21 +190,15 @@ CMPIInstance* RecordingBroker::instance(const cimhost::Instance& instance) {
     return state->objects.make<CMPIInstance>({instance, nullptr, {}});
 }
 
-void RecordingBroker::poseAs(Manager manager) {
-    const cimhost::Profile& profile = cimhost::profileOf(manager);
-    cimhost::applyGaps(profile, state->tables);
-    if (profile.gaps == cimhost::BrokerGaps::memoryTable) {
+void RecordingBroker::emulate(Manager manager) {
+    cimhost::lab::changeTables(manager, state->tables);
+    if (!cimhost::lab::emulationOf(manager)->hasMemoryTable()) {
         state->handle.mft = nullptr;
     }
 }
 
-void RecordingBroker::behaveAs(Manager manager) {
-    poseAs(manager);
-    state->broker.play(manager);
-}
-
-void RecordingBroker::know(cimhost::ClassShapeLookup shapes) {
-    state->shapes = std::move(shapes);
+void RecordingBroker::know(cimhost::ClassInfoLookup classes) {
+    state->classes = std::move(classes);
 }
 
 void RecordingBroker::serve(const std::string& className, std::vector<cimhost::Instance> instances) {

@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "broker/Broker.h"
+#include "lab/emulation/ManagerEmulation.h"
 #include "model/Value.h"
 
 namespace testsupport {
@@ -17,7 +18,7 @@ struct RecordedCall {
     std::vector<std::string> arguments;  ///< those that say something: see RecordingBroker
 };
 
-using cimhost::Manager;
+using cimhost::lab::Manager;
 
 /**
  * A CMPI broker for contract tests of a provider: a real one (cimhost::Broker) that writes down every call and can
@@ -44,7 +45,7 @@ public:
     RecordingBroker(const RecordingBroker&) = delete;
     RecordingBroker& operator=(const RecordingBroker&) = delete;
 
-    /** The broker to hand to a provider's factory. Poses change it, so set them before. */
+    /** The broker to hand to a provider's factory. emulate() changes it, so call that first. */
     const CMPIBroker* handle() const;
 
     /** The host's broker underneath, for RequestScope and runCall(). */
@@ -120,14 +121,11 @@ public:
      */
     ///@{
 
-    /** Looks like that object manager from now on: versions, functions that are null. */
-    void poseAs(Manager manager);
+    /** Has the function tables of that object manager from now on: versions, functions that are null. */
+    void emulate(Manager manager);
 
-    /** Looks like it and treats providers as it does, in requests that are run with broker(); see cimhost::Profile. */
-    void behaveAs(Manager manager);
-
-    /** Knows classes from now on: instances of theirs begin with their keys, and a manager can complete them. */
-    void know(cimhost::ClassShapeLookup shapes);
+    /** Knows classes from now on: their instances begin with their keys. */
+    void know(cimhost::ClassInfoLookup classes);
     ///@}
 
     /** @name Up-calls

@@ -10,7 +10,7 @@ namespace {
 
 template <class Type>
 cimhost::Value single(CMPIType type, Type value) {
-    return {type, false, false, {std::move(value)}};
+    return cimhost::Value::of(type, std::move(value));
 }
 
 }  // namespace

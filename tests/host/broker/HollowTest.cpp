@@ -14,7 +14,7 @@ protected:
 };
 
 TEST_F(HollowTest, AStringMayHaveNoCharacters) {
-    const CMPIData data = textOf(instanceWith(cimhost::hollowText(false)));
+    const CMPIData data = textOf(instanceWith(cimhost::Value::stringWithoutCharacters()));
     EXPECT_EQ(status.rc, CMPI_RC_OK);
     EXPECT_EQ(data.state, CMPI_goodValue);
     ASSERT_NE(data.value.string, nullptr);
@@ -23,21 +23,21 @@ TEST_F(HollowTest, AStringMayHaveNoCharacters) {
 }
 
 TEST_F(HollowTest, ANullTextMayBeAnObject) {
-    const CMPIData data = textOf(instanceWith(cimhost::hollowText(true)));
+    const CMPIData data = textOf(instanceWith(cimhost::Value::nullStringObject()));
     EXPECT_EQ(data.state, CMPI_nullValue);
     ASSERT_NE(data.value.string, nullptr);
     EXPECT_EQ(data.value.string->ft->getCharPtr(data.value.string, nullptr), nullptr);
 }
 
 TEST_F(HollowTest, ACopyOfAHollowStringIsHollow) {
-    const CMPIData data = textOf(instanceWith(cimhost::hollowText(false)));
+    const CMPIData data = textOf(instanceWith(cimhost::Value::stringWithoutCharacters()));
     CMPIString* copy = data.value.string->ft->clone(data.value.string, nullptr);
     EXPECT_EQ(copy->ft->getCharPtr(copy, nullptr), nullptr);
     copy->ft->release(copy);
 }
 
 TEST_F(HollowTest, AHollowStringIsNullWhereItIsSet) {
-    const CMPIData data = textOf(instanceWith(cimhost::hollowText(false)));
+    const CMPIData data = textOf(instanceWith(cimhost::Value::stringWithoutCharacters()));
     CMPIInstance* other = newInstance();
     EXPECT_EQ(other->ft->setProperty(other, "Text", &data.value, CMPI_string).rc, CMPI_RC_OK);
     EXPECT_EQ(textOf(other).state, CMPI_nullValue);

@@ -2,7 +2,7 @@
 
 namespace {
 
-using cimhost::ClassShape;
+using cimhost::ClassInfo;
 
 class InstanceTest : public BrokerTest {
 protected:
@@ -149,12 +149,12 @@ TEST_F(InstanceTest, AFilterDropsPropertiesSetBeforeAndAfter) {
 class KnownClassTest : public InstanceTest {
 protected:
     static cimhost::BrokerOptions options() {
-        auto shape = std::make_shared<ClassShape>();
+        auto shape = std::make_shared<ClassInfo>();
         shape->name = "Known";
         shape->properties = {{"Other", CMPI_uint32, false, false}, {"Name", CMPI_string, false, true}};
         shape->superclasses = {"Middle", "Top"};
         cimhost::BrokerOptions made;
-        made.classShape = [shape](const std::string& name) { return name == "Known" ? shape : nullptr; };
+        made.classInfo = [shape](const std::string& name) { return name == "Known" ? shape : nullptr; };
         return made;
     }
 

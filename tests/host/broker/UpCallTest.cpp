@@ -4,56 +4,40 @@
 
 namespace {
 
-using cimhost::Answer;
-using cimhost::ContextEntries;
-using cimhost::Instance;
-using cimhost::ObjectPath;
-using cimhost::PropertyList;
-using cimhost::Status;
-using cimhost::Value;
+using cimhost::Operation;
+using cimhost::Request;
+using cimhost::Response;
 
-/** Answers some operations with what it was asked. */
+/** Responds to some operations with their arguments. */
 class Echo : public cimhost::UpCalls {
 public:
-    Answer<std::vector<Instance>> enumerateInstances(const ContextEntries& context, const ObjectPath& path,
-                                                     const PropertyList& properties) override {
-        if (path.className == "Throwing") {
+    Response perform(Request request) override {
+        last = request;
+        if (request.path.className == "Throwing") {
             throw std::runtime_error("broken");
         }
-        if (path.className == "Failing") {
-            return {{CMPI_RC_ERR_ACCESS_DENIED, "not you"}, {}};
+        if (request.path.className == "Failing") {
+            return Response::failed({CMPI_RC_ERR_ACCESS_DENIED, "not you"});
         }
-        lastContext = context;
-        lastProperties = properties;
-        return {{}, {{path, {}}, {{{}, path.nameSpace, "Second", {}}, {}}}};
+        switch (request.operation) {
+            case Operation::enumerateInstances:
+                return Response::ofInstances({{request.path, {}}, {{{}, request.path.nameSpace, "Second", {}}, {}}});
+            case Operation::associatorNames:
+                return Response::ofPaths({request.path});
+            case Operation::getInstance:
+                return Response::ofInstances({{request.path, {testsupport::named("P", testsupport::uint32(1))}}});
+            case Operation::createInstance:
+                return Response::ofPaths({request.instance.path});
+            case Operation::deleteInstance:
+                return {};
+            case Operation::invokeMethod:
+                return Response::ofValue(testsupport::text(request.member), request.input);
+            default:
+                return cimhost::notSupported(request.operation);
+        }
     }
 
-    Answer<std::vector<ObjectPath>> associatorNames(const ContextEntries&, const ObjectPath& path,
-                                                    const cimhost::AssociationFilter& filter) override {
-        lastFilter = filter;
-        return {{}, {path}};
-    }
-
-    Answer<Instance> getInstance(const ContextEntries&, const ObjectPath& path, const PropertyList&) override {
-        return {{}, {path, {testsupport::named("P", testsupport::uint32(1))}}};
-    }
-
-    Answer<ObjectPath> createInstance(const ContextEntries&, const ObjectPath&, const Instance& instance) override {
-        return {{}, instance.path};
-    }
-
-    Status deleteInstance(const ContextEntries&, const ObjectPath&) override { return {}; }
-
-    Answer<Value> invokeMethod(const ContextEntries&, const ObjectPath&, const std::string& method,
-                               const std::vector<cimhost::NamedValue>& input,
-                               std::vector<cimhost::NamedValue>& output) override {
-        output = input;
-        return {{}, testsupport::text(method)};
-    }
-
-    ContextEntries lastContext;
-    PropertyList lastProperties;
-    cimhost::AssociationFilter lastFilter;
+    Request last;
 };
 
 class UpCallTest : public BrokerTest {
@@ -95,20 +79,20 @@ TEST_F(UpCallTest, AnEnumerationIsWalkedThroughOnce) {
 TEST_F(UpCallTest, ContextAndPropertyListGoAlong) {
     const char* list[] = {"A", "B", nullptr};
     up().enumerateInstances(caller(), context, newPath(), list, &status);
-    EXPECT_EQ(testsupport::textOf(echo.lastContext, "Mine"), "kept");
-    EXPECT_EQ(echo.lastProperties, (std::vector<std::string>{"A", "B"}));
+    EXPECT_EQ(testsupport::textOf(echo.last.context, "Mine"), "kept");
+    EXPECT_EQ(echo.last.properties, (std::vector<std::string>{"A", "B"}));
     up().enumerateInstances(caller(), nullptr, newPath(), nullptr, &status);
     EXPECT_EQ(status.rc, CMPI_RC_OK);
-    EXPECT_EQ(echo.lastProperties, std::nullopt);
+    EXPECT_EQ(echo.last.properties, std::nullopt);
 }
 
 TEST_F(UpCallTest, AFilterKeepsNullAndEmptyApart) {
     up().associatorNames(caller(), context, newPath(), "Assoc", "", nullptr, "Role", &status);
     EXPECT_EQ(status.rc, CMPI_RC_OK);
-    EXPECT_EQ(echo.lastFilter.associationClass, "Assoc");
-    EXPECT_EQ(echo.lastFilter.resultClass, "");
-    EXPECT_EQ(echo.lastFilter.role, std::nullopt);
-    EXPECT_EQ(echo.lastFilter.resultRole, "Role");
+    EXPECT_EQ(echo.last.filter.associationClass, "Assoc");
+    EXPECT_EQ(echo.last.filter.resultClass, "");
+    EXPECT_EQ(echo.last.filter.role, std::nullopt);
+    EXPECT_EQ(echo.last.filter.resultRole, "Role");
 }
 
 TEST_F(UpCallTest, SingleObjectsAreObjects) {

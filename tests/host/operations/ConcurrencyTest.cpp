@@ -2,14 +2,15 @@
 #include <thread>
 
 #include "OperationsFixture.h"
-#include "support/Managers.h"
+#include "lab/emulation/ManagerEmulation.h"
 
 // Many clients at a time, as every manager: providers are started, ask each other, fail and throw, and every client
 // gets the answers to its own requests.
 
 namespace {
 
-using cimhost::Manager;
+using cimhost::Request;
+using cimhost::lab::Manager;
 using testsupport::textOf;
 
 constexpr int clients = 8;
@@ -33,18 +34,22 @@ protected:
 
     void runClient(int number) {
         const int depth = number % 4 + 1;
-        const auto nested = manager().getInstance({}, named("Sample_Recursive", std::to_string(depth).c_str()), {});
+        const auto nested =
+            manager().perform(Request::getInstance(named("Sample_Recursive", std::to_string(depth).c_str())));
         const std::string expected = std::to_string(depth) + ">Below=" + std::to_string(depth - 1);
-        EXPECT_EQ(textOf(nested.value.properties, "Below").value_or("").substr(0, expected.size()), expected);
-        const auto other = manager().enumerateInstances({}, classPath("Sample_CallsOther_Thing"), {});
-        ASSERT_EQ(other.value.size(), 1U) << other.status.message;
-        EXPECT_EQ(other.value.front().path.className, "Other_Thing");
-        EXPECT_EQ(manager().enumerateInstances({}, classPath("Sample_Failing"), {}).status.message, "not for you");
-        EXPECT_EQ(manager().enumerateInstances({}, classPath("Sample_Throwing"), {}).status.rc, CMPI_RC_ERR_FAILED);
+        EXPECT_EQ(textOf(nested.instance().properties, "Below").value_or("").substr(0, expected.size()), expected);
+        const auto other = manager().perform(Request::enumerateInstances(classPath("Sample_CallsOther_Thing")));
+        ASSERT_EQ(other.instances.size(), 1U) << other.status.message;
+        EXPECT_EQ(other.instance().path.className, "Other_Thing");
+        EXPECT_EQ(manager().perform(Request::enumerateInstances(classPath("Sample_Failing"))).status.message,
+                  "not for you");
+        EXPECT_EQ(manager().perform(Request::enumerateInstances(classPath("Sample_Throwing"))).status.rc,
+                  CMPI_RC_ERR_FAILED);
         const std::string role = "role " + std::to_string(number);
-        const auto far = manager().associators({}, named("Sample_Thing", "x"), {"Sample_Link", {}, role, {}}, {});
-        ASSERT_EQ(far.value.size(), 1U) << far.status.message;
-        EXPECT_EQ(textOf(far.value.front().properties, "Asked"), "Sample_Link,none," + role + ",none");
+        const auto far =
+            manager().perform(Request::associators(named("Sample_Thing", "x"), {"Sample_Link", {}, role, {}}));
+        ASSERT_EQ(far.instances.size(), 1U) << far.status.message;
+        EXPECT_EQ(textOf(far.instance().properties, "Asked"), "Sample_Link,none," + role + ",none");
     }
 
     std::atomic<int> logged{0};
@@ -66,7 +71,7 @@ TEST_P(ConcurrencyTest, EveryClientGetsItsOwnAnswers) {
     EXPECT_GT(logged, 0) << "factories log";
 }
 
-INSTANTIATE_TEST_SUITE_P(Managers, ConcurrencyTest, testing::ValuesIn(testsupport::everyManager),
-                         testsupport::ManagerName());
+INSTANTIATE_TEST_SUITE_P(Managers, ConcurrencyTest, testing::ValuesIn(cimhost::lab::everyManager),
+                         cimhost::lab::ManagerName());
 
 }  // namespace

@@ -9,10 +9,11 @@
 namespace {
 
 using cimhost::LibraryError;
+using cimhost::Request;
 
 class LoadingTest : public OperationsTest {
 protected:
-    void ask(const char* className) { manager().enumerateInstances({}, classPath(className), {}); }
+    void ask(const char* className) { manager().perform(Request::enumerateInstances(classPath(className))); }
 
     /** The text of the LibraryError that asking for a class ends with; empty when it does not. */
     std::string errorOf(const char* className) {
@@ -36,8 +37,8 @@ protected:
 TEST_F(LoadingTest, FactoriesAreCalledOnceAnInterface) {
     ask("Sample_Thing");
     ask("Sample_Silent");
-    manager().associatorNames({}, named("Sample_Thing", "x"), {});
-    manager().associatorNames({}, named("Sample_Thing", "x"), {});
+    manager().perform(Request::associatorNames(named("Sample_Thing", "x"), {}));
+    manager().perform(Request::associatorNames(named("Sample_Thing", "x"), {}));
     EXPECT_THAT(log, testing::ElementsAre("instance factory", "association factory"));
 }
 
@@ -50,7 +51,7 @@ TEST_F(LoadingTest, NothingIsLoadedBeforeItIsNeeded) {
 
 TEST_F(LoadingTest, TheEndCleansUpAndUnloads) {
     ask("Sample_Thing");
-    manager().associatorNames({}, named("Sample_Thing", "x"), {});
+    manager().perform(Request::associatorNames(named("Sample_Thing", "x"), {}));
     EXPECT_TRUE(isLoaded("libSampleProvider.so"));
     log.clear();
     started.reset();
@@ -65,13 +66,13 @@ TEST_F(LoadingTest, AProviderThatWantsToStayStays) {
 }
 
 TEST_F(LoadingTest, TheGenericFactoryIsToldTheName) {
-    const auto found = manager().enumerateInstances({}, classPath("Other_Thing"), {});
-    ASSERT_EQ(found.value.size(), 1U);
-    EXPECT_EQ(testsupport::textOf(found.value.front().properties, "Provider"), "Anything");
+    const auto found = manager().perform(Request::enumerateInstances(classPath("Other_Thing")));
+    ASSERT_EQ(found.instances.size(), 1U);
+    EXPECT_EQ(testsupport::textOf(found.instance().properties, "Provider"), "Anything");
 }
 
 TEST_F(LoadingTest, AMissingFunctionIsNotSupported) {
-    const auto found = manager().getInstance({}, classPath("Other_Thing"), {});
+    const auto found = manager().perform(Request::getInstance(classPath("Other_Thing")));
     EXPECT_EQ(found.status.rc, CMPI_RC_ERR_NOT_SUPPORTED);
 }
 
@@ -113,7 +114,7 @@ TEST_F(LoadingTest, SeveralThreadsStartAProviderOnce) {
     manager();
     const auto work = [this] {
         for (int i = 0; i < 50; ++i) {
-            EXPECT_TRUE(manager().enumerateInstances({}, classPath("Sample_CallsOther_Thing"), {}).ok());
+            EXPECT_TRUE(manager().perform(Request::enumerateInstances(classPath("Sample_CallsOther_Thing"))).ok());
         }
     };
     std::thread first(work);
@@ -125,9 +126,9 @@ TEST_F(LoadingTest, SeveralThreadsStartAProviderOnce) {
 
 TEST_F(LoadingTest, ALaterRegistrationReplacesAnEarlierOne) {
     add("SAMPLE_THING", "Anything", "OtherProvider", true, false);
-    const auto found = manager().enumerateInstances({}, classPath("Sample_Thing"), {});
-    ASSERT_EQ(found.value.size(), 1U);
-    EXPECT_EQ(found.value.front().path.className, "Other_Thing");
+    const auto found = manager().perform(Request::enumerateInstances(classPath("Sample_Thing")));
+    ASSERT_EQ(found.instances.size(), 1U);
+    EXPECT_EQ(found.instance().path.className, "Other_Thing");
 }
 
 TEST_F(LoadingTest, AnInterfaceRefusesOperationsOfTheOtherKind) {

@@ -4,31 +4,32 @@ namespace {
 
 using cimhost::Instance;
 using cimhost::ObjectPath;
+using cimhost::Request;
 using testsupport::text;
 using testsupport::textOf;
 
 class ObjectManagerTest : public OperationsTest {
 protected:
-    cimhost::Answer<ObjectPath> create(const char* className, const char* name) {
-        return manager().createInstance({}, named(className, name), {});
+    cimhost::Response create(const char* className, const char* name) {
+        return manager().perform(Request::createInstance(named(className, name), {}));
     }
 };
 
 TEST_F(ObjectManagerTest, CreatesFindsAndDeletes) {
     const auto created = create("Sample_Thing", "a");
     ASSERT_TRUE(created.ok()) << created.status.message;
-    EXPECT_EQ(testsupport::toText(created.value), "root/cimv2:Sample_Thing.Name=\"a\"");
-    const auto names = manager().enumerateInstanceNames({}, classPath("Sample_Thing"));
-    ASSERT_EQ(names.value.size(), 1U);
-    EXPECT_EQ(textOf(names.value.front().keys, "Name"), "a");
-    const auto found = manager().getInstance({}, created.value, {});
-    EXPECT_EQ(textOf(found.value.properties, "Name"), "a");
-    EXPECT_TRUE(manager().deleteInstance({}, created.value).ok());
-    EXPECT_TRUE(manager().enumerateInstances({}, classPath("Sample_Thing"), {}).value.empty());
+    EXPECT_EQ(testsupport::toText(created.path()), "root/cimv2:Sample_Thing.Name=\"a\"");
+    const auto names = manager().perform(Request::enumerateInstanceNames(classPath("Sample_Thing")));
+    ASSERT_EQ(names.paths.size(), 1U);
+    EXPECT_EQ(textOf(names.path().keys, "Name"), "a");
+    const auto found = manager().perform(Request::getInstance(created.path()));
+    EXPECT_EQ(textOf(found.instance().properties, "Name"), "a");
+    EXPECT_TRUE(manager().perform(Request::deleteInstance(created.path())).ok());
+    EXPECT_TRUE(manager().perform(Request::enumerateInstances(classPath("Sample_Thing"))).instances.empty());
 }
 
 TEST_F(ObjectManagerTest, GetInstanceWithoutAnInstanceIsNotFound) {
-    const auto found = manager().getInstance({}, named("Sample_Thing", "missing"), {});
+    const auto found = manager().perform(Request::getInstance(named("Sample_Thing", "missing")));
     EXPECT_EQ(found.status.rc, CMPI_RC_ERR_NOT_FOUND);
     EXPECT_THAT(found.status.message, testing::HasSubstr("Sample_Thing.Name=\"missing\""));
 }
@@ -36,7 +37,7 @@ TEST_F(ObjectManagerTest, GetInstanceWithoutAnInstanceIsNotFound) {
 TEST_F(ObjectManagerTest, CreateInstanceMayReturnAnInstance) {
     const auto created = create("Sample_ReturnsInstance", "b");
     ASSERT_TRUE(created.ok());
-    EXPECT_EQ(testsupport::toText(created.value), "root/cimv2:Sample_Thing.Name=\"b\"");
+    EXPECT_EQ(testsupport::toText(created.path()), "root/cimv2:Sample_Thing.Name=\"b\"");
 }
 
 TEST_F(ObjectManagerTest, CreateInstanceMustReturnSomething) {
@@ -48,143 +49,147 @@ TEST_F(ObjectManagerTest, CreateInstanceMustReturnSomething) {
 TEST_F(ObjectManagerTest, CreateHandsOverKeysThenProperties) {
     Instance given;
     given.properties = {testsupport::named("Colour", text("red"))};
-    ASSERT_TRUE(manager().createInstance({}, named("Sample_Thing", "d"), given).ok());
-    const auto found = manager().getInstance({}, named("Sample_Thing", "d"), {});
-    EXPECT_EQ(textOf(found.value.properties, "Text"), "Name=d;Colour=red;");
+    ASSERT_TRUE(manager().perform(Request::createInstance(named("Sample_Thing", "d"), given)).ok());
+    const auto found = manager().perform(Request::getInstance(named("Sample_Thing", "d")));
+    EXPECT_EQ(textOf(found.instance().properties, "Text"), "Name=d;Colour=red;");
 }
 
 TEST_F(ObjectManagerTest, CreateHandsOverNoKeyTwice) {
     Instance given;
     given.properties = {testsupport::named("Colour", text("red")), testsupport::named("NAME", text("e"))};
-    ASSERT_TRUE(manager().createInstance({}, named("Sample_Thing", "e"), given).ok());
-    const auto found = manager().getInstance({}, named("Sample_Thing", "e"), {});
-    EXPECT_EQ(textOf(found.value.properties, "Text"), "Colour=red;NAME=e;");
+    ASSERT_TRUE(manager().perform(Request::createInstance(named("Sample_Thing", "e"), given)).ok());
+    const auto found = manager().perform(Request::getInstance(named("Sample_Thing", "e")));
+    EXPECT_EQ(textOf(found.instance().properties, "Text"), "Colour=red;NAME=e;");
 }
 
 TEST_F(ObjectManagerTest, ModifyHandsOverExactlyTheProperties) {
     create("Sample_Thing", "f");
     Instance given;
     given.properties = {testsupport::named("Colour", text("blue"))};
-    ASSERT_TRUE(manager().modifyInstance({}, named("Sample_Thing", "f"), given, {}).ok());
-    const auto found = manager().getInstance({}, named("Sample_Thing", "f"), {});
-    EXPECT_EQ(textOf(found.value.properties, "Text"), "Colour=blue;");
+    ASSERT_TRUE(manager().perform(Request::modifyInstance(named("Sample_Thing", "f"), given)).ok());
+    const auto found = manager().perform(Request::getInstance(named("Sample_Thing", "f")));
+    EXPECT_EQ(textOf(found.instance().properties, "Text"), "Colour=blue;");
 }
 
 TEST_F(ObjectManagerTest, AFailureWithoutAMessageGetsOne) {
-    const auto status = manager().deleteInstance({}, named("Sample_Thing", "missing"));
+    const auto status = manager().perform(Request::deleteInstance(named("Sample_Thing", "missing")));
     EXPECT_EQ(status.rc, CMPI_RC_ERR_NOT_FOUND);
     EXPECT_FALSE(status.message.empty());
 }
 
 TEST_F(ObjectManagerTest, AFailureKeepsItsMessageAndGivesNoResults) {
-    const auto found = manager().enumerateInstances({}, classPath("Sample_Failing"), {});
+    const auto found = manager().perform(Request::enumerateInstances(classPath("Sample_Failing")));
     EXPECT_EQ(found.status.rc, CMPI_RC_ERR_ACCESS_DENIED);
     EXPECT_EQ(found.status.message, "not for you");
-    EXPECT_TRUE(found.value.empty());
+    EXPECT_TRUE(found.instances.empty());
 }
 
 TEST_F(ObjectManagerTest, AnUnknownClassIsInvalid) {
-    const auto found = manager().enumerateInstances({}, classPath("Missing"), {});
+    const auto found = manager().perform(Request::enumerateInstances(classPath("Missing")));
     EXPECT_EQ(found.status.rc, CMPI_RC_ERR_INVALID_CLASS);
     EXPECT_THAT(found.status.message, testing::AllOf(testing::HasSubstr("Missing"), testing::HasSubstr("root/cimv2")));
-    EXPECT_EQ(manager().enumerateInstances({}, classPath("Sample_OtherLink"), {}).status.rc, CMPI_RC_ERR_INVALID_CLASS)
+    EXPECT_EQ(manager().perform(Request::enumerateInstances(classPath("Sample_OtherLink"))).status.rc,
+              CMPI_RC_ERR_INVALID_CLASS)
         << "registered as an association only";
 }
 
 TEST_F(ObjectManagerTest, AnUnknownNameSpaceIsInvalid) {
-    const auto found = manager().enumerateInstances({}, testsupport::objectPath("root/nowhere", "Sample_Thing"), {});
+    const auto found =
+        manager().perform(Request::enumerateInstances(testsupport::objectPath("root/nowhere", "Sample_Thing")));
     EXPECT_EQ(found.status.rc, CMPI_RC_ERR_INVALID_NAMESPACE);
     EXPECT_THAT(found.status.message, testing::HasSubstr("root/nowhere"));
 }
 
 TEST_F(ObjectManagerTest, NamesIgnoreLetterCase) {
-    EXPECT_TRUE(manager().enumerateInstances({}, testsupport::objectPath("ROOT/cimV2", "sample_THING"), {}).ok());
+    EXPECT_TRUE(
+        manager().perform(Request::enumerateInstances(testsupport::objectPath("ROOT/cimV2", "sample_THING"))).ok());
 }
 
 TEST_F(ObjectManagerTest, ResultsOfTheWrongKindAreAFailure) {
-    const auto names = manager().enumerateInstanceNames({}, classPath("Sample_WrongKind"));
+    const auto names = manager().perform(Request::enumerateInstanceNames(classPath("Sample_WrongKind")));
     EXPECT_EQ(names.status.rc, CMPI_RC_ERR_FAILED);
     EXPECT_THAT(names.status.message, testing::HasSubstr("EnumerateInstanceNames"));
 }
 
 TEST_F(ObjectManagerTest, APropertyListGoesToTheProvider) {
     create("Sample_Thing", "g");
-    const auto found =
-        manager().enumerateInstances({}, classPath("Sample_Thing"), std::vector<std::string>{"Wanted", "Also"});
-    ASSERT_EQ(found.value.size(), 1U);
-    EXPECT_EQ(textOf(found.value.front().properties, "Text"), "Wanted");
+    const auto found = manager().perform(
+        Request::enumerateInstances(classPath("Sample_Thing"), std::vector<std::string>{"Wanted", "Also"}));
+    ASSERT_EQ(found.instances.size(), 1U);
+    EXPECT_EQ(textOf(found.instance().properties, "Text"), "Wanted");
 }
 
 TEST_F(ObjectManagerTest, CompletesTheContext) {
-    const auto plain = manager().enumerateInstances({}, classPath("Sample_Context"), {});
-    EXPECT_EQ(textOf(plain.value.front().properties, "Name"), "root/cimv2;;0");
+    const auto plain = manager().perform(Request::enumerateInstances(classPath("Sample_Context")));
+    EXPECT_EQ(textOf(plain.instance().properties, "Name"), "root/cimv2;;0");
     const cimhost::ContextEntries given{testsupport::named("cmpiPrincipal", text("anna")),
                                         testsupport::named(CMPIInvocationFlags, testsupport::uint32(4))};
-    const auto own = manager().enumerateInstances(given, classPath("Sample_Context"), {});
-    EXPECT_EQ(textOf(own.value.front().properties, "Name"), "root/cimv2;anna;4");
+    const auto own = manager().perform(Request::enumerateInstances(classPath("Sample_Context")).with(given));
+    EXPECT_EQ(textOf(own.instance().properties, "Name"), "root/cimv2;anna;4");
 }
 
 TEST_F(ObjectManagerTest, OptionsGiveEveryRequestContextEntries) {
     options.context = {testsupport::named(CMPIPrincipal, text("daemon"))};
-    const auto found = manager().enumerateInstances({}, classPath("Sample_Context"), {});
-    EXPECT_EQ(textOf(found.value.front().properties, "Name"), "root/cimv2;daemon;0");
+    const auto found = manager().perform(Request::enumerateInstances(classPath("Sample_Context")));
+    EXPECT_EQ(textOf(found.instance().properties, "Name"), "root/cimv2;daemon;0");
 }
 
 TEST_F(ObjectManagerTest, AnExceptionOfAProviderIsAFailure) {
-    const auto thrown = manager().enumerateInstances({}, classPath("Sample_Throwing"), {});
+    const auto thrown = manager().perform(Request::enumerateInstances(classPath("Sample_Throwing")));
     EXPECT_EQ(thrown.status.rc, CMPI_RC_ERR_FAILED);
     EXPECT_THAT(thrown.status.message, testing::HasSubstr("out of paper"));
-    EXPECT_EQ(manager().enumerateInstances({}, classPath("Sample_ThrowingOdd"), {}).status.rc, CMPI_RC_ERR_FAILED);
-    EXPECT_TRUE(manager().enumerateInstances({}, classPath("Sample_Thing"), {}).ok()) << "life goes on";
+    EXPECT_EQ(manager().perform(Request::enumerateInstances(classPath("Sample_ThrowingOdd"))).status.rc,
+              CMPI_RC_ERR_FAILED);
+    EXPECT_TRUE(manager().perform(Request::enumerateInstances(classPath("Sample_Thing"))).ok()) << "life goes on";
 }
 
 TEST_F(ObjectManagerTest, TheRawAnswerTellsEverything) {
     cimhost::Request request;
     request.path = classPath("Sample_Failing");
-    auto failing = manager().run(request);
+    auto failing = manager().perform(request);
     ASSERT_TRUE(failing.ok());
-    ASSERT_EQ(failing.value.size(), 1U);
-    EXPECT_EQ(failing.value.front().status.rc, CMPI_RC_ERR_ACCESS_DENIED);
-    EXPECT_TRUE(failing.value.front().hasMessage);
-    EXPECT_FALSE(failing.value.front().threw);
-    EXPECT_EQ(cimhost::eventsOf<Instance>(failing.value.front().events).size(), 1U);
-    EXPECT_EQ(failing.value.front().doneCount(), 0);
+    ASSERT_EQ(failing.providers.size(), 1U);
+    EXPECT_EQ(failing.providers.front().status.rc, CMPI_RC_ERR_ACCESS_DENIED);
+    EXPECT_TRUE(failing.providers.front().hasMessage);
+    EXPECT_FALSE(failing.providers.front().threw);
+    EXPECT_EQ(cimhost::eventsOf<Instance>(failing.providers.front().events).size(), 1U);
+    EXPECT_EQ(failing.providers.front().doneCount(), 0);
 
     request.path = classPath("Sample_Throwing");
-    EXPECT_TRUE(manager().run(request).value.front().threw);
+    EXPECT_TRUE(manager().perform(request).providers.front().threw);
     request.path = classPath("Sample_Thing");
-    EXPECT_EQ(manager().run(request).value.front().doneCount(), 1);
+    EXPECT_EQ(manager().perform(request).providers.front().doneCount(), 1);
 }
 
 // Up-calls.
 
 TEST_F(ObjectManagerTest, AnUpCallReachesTheSameLibrary) {
     create("Sample_Thing", "h");
-    const auto found = manager().enumerateInstances({}, classPath("Sample_CallsSample_Thing"), {});
-    ASSERT_EQ(found.value.size(), 1U) << found.status.message;
-    EXPECT_EQ(textOf(found.value.front().properties, "Name"), "h");
+    const auto found = manager().perform(Request::enumerateInstances(classPath("Sample_CallsSample_Thing")));
+    ASSERT_EQ(found.instances.size(), 1U) << found.status.message;
+    EXPECT_EQ(textOf(found.instance().properties, "Name"), "h");
 }
 
 TEST_F(ObjectManagerTest, AnUpCallReachesAnotherLibrary) {
-    const auto found = manager().enumerateInstances({}, classPath("Sample_CallsOther_Thing"), {});
-    ASSERT_EQ(found.value.size(), 1U) << found.status.message;
-    EXPECT_EQ(found.value.front().path.className, "Other_Thing");
+    const auto found = manager().perform(Request::enumerateInstances(classPath("Sample_CallsOther_Thing")));
+    ASSERT_EQ(found.instances.size(), 1U) << found.status.message;
+    EXPECT_EQ(found.instance().path.className, "Other_Thing");
 }
 
 TEST_F(ObjectManagerTest, UpCallsNest) {
-    const auto found = manager().getInstance({}, named("Sample_Recursive", "3"), {});
+    const auto found = manager().perform(Request::getInstance(named("Sample_Recursive", "3")));
     ASSERT_TRUE(found.ok()) << found.status.message;
-    EXPECT_EQ(textOf(found.value.properties, "Below"), "3>Below=2>Below=1>Below=0>bottom;;;");
+    EXPECT_EQ(textOf(found.instance().properties, "Below"), "3>Below=2>Below=1>Below=0>bottom;;;");
 }
 
 TEST_F(ObjectManagerTest, AFailingUpCallTellsTheCaller) {
-    const auto missing = manager().enumerateInstances({}, classPath("Sample_CallsMissing"), {});
+    const auto missing = manager().perform(Request::enumerateInstances(classPath("Sample_CallsMissing")));
     EXPECT_EQ(missing.status.rc, CMPI_RC_ERR_INVALID_CLASS);
     EXPECT_THAT(missing.status.message, testing::HasSubstr("Missing"));
-    const auto throwing = manager().enumerateInstances({}, classPath("Sample_CallsSample_Throwing"), {});
+    const auto throwing = manager().perform(Request::enumerateInstances(classPath("Sample_CallsSample_Throwing")));
     EXPECT_EQ(throwing.status.rc, CMPI_RC_ERR_FAILED);
     EXPECT_THAT(throwing.status.message, testing::HasSubstr("out of paper"));
-    const auto unloadable = manager().enumerateInstances({}, classPath("Sample_CallsUnloadable"), {});
+    const auto unloadable = manager().perform(Request::enumerateInstances(classPath("Sample_CallsUnloadable")));
     EXPECT_EQ(unloadable.status.rc, CMPI_RC_ERR_FAILED);
     EXPECT_THAT(unloadable.status.message, testing::HasSubstr("libDoesNotExist.so"));
 }
@@ -193,43 +198,47 @@ TEST_F(ObjectManagerTest, AFailingUpCallTellsTheCaller) {
 
 TEST_F(ObjectManagerTest, AssociationsGoByTheirClass) {
     const cimhost::AssociationFilter filter{"sample_link", "Far", "Here", std::nullopt};
-    const auto found = manager().associators({}, named("Sample_Thing", "x"), filter, {});
-    ASSERT_EQ(found.value.size(), 1U) << found.status.message;
-    EXPECT_EQ(textOf(found.value.front().properties, "Asked"), "sample_link,Far,Here,none");
+    const auto found = manager().perform(Request::associators(named("Sample_Thing", "x"), filter));
+    ASSERT_EQ(found.instances.size(), 1U) << found.status.message;
+    EXPECT_EQ(textOf(found.instance().properties, "Asked"), "sample_link,Far,Here,none");
 }
 
 TEST_F(ObjectManagerTest, WithoutAClassAllAssociationsAreAsked) {
-    const auto found = manager().associatorNames({}, named("Sample_Thing", "x"), {});
-    ASSERT_EQ(found.value.size(), 2U);
-    EXPECT_EQ(textOf(found.value[0].keys, "Asked"), "Sample_Link");
-    EXPECT_EQ(textOf(found.value[1].keys, "Asked"), "Sample_OtherLink");
+    const auto found = manager().perform(Request::associatorNames(named("Sample_Thing", "x"), {}));
+    ASSERT_EQ(found.paths.size(), 2U);
+    EXPECT_EQ(textOf(found.paths[0].keys, "Asked"), "Sample_Link");
+    EXPECT_EQ(textOf(found.paths[1].keys, "Asked"), "Sample_OtherLink");
 }
 
 TEST_F(ObjectManagerTest, ASuperclassStandsForItsAssociations) {
-    auto shape = std::make_shared<cimhost::ClassShape>();
+    auto shape = std::make_shared<cimhost::ClassInfo>();
     shape->name = "Sample_OtherLink";
     shape->superclasses = {"Sample_AnyLink"};
-    options.classShape = [shape](const std::string& name) {
-        return name == shape->name ? shape : std::shared_ptr<const cimhost::ClassShape>();
+    options.classInfo = [shape](const std::string& name) {
+        return name == shape->name ? shape : std::shared_ptr<const cimhost::ClassInfo>();
     };
-    const auto found = manager().associatorNames({}, named("Sample_Thing", "x"), {"Sample_AnyLink", {}, {}, {}});
-    ASSERT_EQ(found.value.size(), 1U);
-    EXPECT_EQ(textOf(found.value[0].keys, "Asked"), "Sample_OtherLink");
+    const auto found =
+        manager().perform(Request::associatorNames(named("Sample_Thing", "x"), {"Sample_AnyLink", {}, {}, {}}));
+    ASSERT_EQ(found.paths.size(), 1U);
+    EXPECT_EQ(textOf(found.paths[0].keys, "Asked"), "Sample_OtherLink");
 }
 
 TEST_F(ObjectManagerTest, AnUnknownAssociationIsInvalid) {
-    const auto found = manager().associators({}, named("Sample_Thing", "x"), {"Sample_Thing", {}, {}, {}}, {});
+    const auto found =
+        manager().perform(Request::associators(named("Sample_Thing", "x"), {"Sample_Thing", {}, {}, {}}));
     EXPECT_EQ(found.status.rc, CMPI_RC_ERR_INVALID_CLASS);
     EXPECT_THAT(found.status.message, testing::HasSubstr("No association provider"));
 }
 
 TEST_F(ObjectManagerTest, AProviderThatDoesNotSupportAnAssociationOperationIsPassedOver) {
-    const auto found = manager().references({}, named("Sample_Thing", "x"), {}, {});
+    const auto found = manager().perform(Request::references(named("Sample_Thing", "x"), {}));
     ASSERT_TRUE(found.ok()) << found.status.message;
-    EXPECT_EQ(found.value.size(), 1U);
-    EXPECT_EQ(manager().references({}, named("Sample_Thing", "x"), {{}, "Sample_OtherLink", {}, {}}, {}).status.rc,
+    EXPECT_EQ(found.instances.size(), 1U);
+    EXPECT_EQ(
+        manager().perform(Request::references(named("Sample_Thing", "x"), {{}, "Sample_OtherLink", {}, {}})).status.rc,
+        CMPI_RC_ERR_NOT_SUPPORTED);
+    EXPECT_EQ(manager().perform(Request::referenceNames(named("Sample_Thing", "x"), {})).status.rc,
               CMPI_RC_ERR_NOT_SUPPORTED);
-    EXPECT_EQ(manager().referenceNames({}, named("Sample_Thing", "x"), {}).status.rc, CMPI_RC_ERR_NOT_SUPPORTED);
 }
 
 }  // namespace

@@ -8,7 +8,7 @@
 #include <string>
 #include <vector>
 
-#include "operations/LibraryError.h"
+#include "operations/LoadedLibrary.h"
 #include "operations/ObjectManager.h"
 #include "support/Values.h"
 

@@ -3,7 +3,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "operations/LibraryError.h"
+#include "operations/LoadedLibrary.h"
 #include "support/Values.h"
 
 namespace {

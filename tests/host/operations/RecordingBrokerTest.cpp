@@ -199,8 +199,8 @@ TEST_F(RecordingBrokerTest, ServesInstances) {
     EXPECT_EQ(status.rc, CMPI_RC_ERR_INVALID_CLASS);
 }
 
-TEST_F(RecordingBrokerTest, PosesAsSfcb) {
-    recorder.poseAs(Manager::sfcb);
+TEST_F(RecordingBrokerTest, EmulatesTheTablesOfSfcb) {
+    recorder.emulate(Manager::sfcb);
     EXPECT_EQ(handle()->bft->brokerVersion, 0U);
     EXPECT_EQ(handle()->eft->ftVersion, 1);
     EXPECT_EQ(handle()->eft->newCMPIError, nullptr);
@@ -212,25 +212,22 @@ TEST_F(RecordingBrokerTest, PosesAsSfcb) {
     EXPECT_NE(newPath(), nullptr);
 }
 
-TEST_F(RecordingBrokerTest, PosesAsOpenPegasus) {
-    recorder.poseAs(Manager::openPegasus);
+TEST_F(RecordingBrokerTest, EmulatesTheTablesOfOpenPegasus) {
+    recorder.emulate(Manager::openPegasus);
     EXPECT_EQ(handle()->mft, nullptr);
     EXPECT_EQ(handle()->bft->brokerVersion, 200U);
 }
 
-TEST_F(RecordingBrokerTest, APoseIsLooksOnly) {
-    recorder.poseAs(Manager::sfcb);
-    EXPECT_EQ(recorder.broker().profile().manager, Manager::standard);
-    recorder.behaveAs(Manager::sfcb);
-    EXPECT_EQ(recorder.broker().profile().manager, Manager::sfcb);
+TEST_F(RecordingBrokerTest, EmulatingRecordsNoCalls) {
+    recorder.emulate(Manager::sfcb);
     EXPECT_EQ(handle()->bft->brokerVersion, 0U);
     EXPECT_TRUE(recorder.calls().empty());
 }
 
 TEST_F(RecordingBrokerTest, KnowsTheClassesThatItIsTold) {
     recorder.know([](const std::string& name) {
-        return std::make_shared<cimhost::ClassShape>(
-            cimhost::ClassShape{name, {{"Size", CMPI_uint32, false, false, {}}}, {}});
+        return std::make_shared<cimhost::ClassInfo>(
+            cimhost::ClassInfo{name, {{"Size", CMPI_uint32, false, false, {}}}, {}});
     });
     CMPIInstance* instance = handle()->eft->newInstance(handle(), newPath(), &status);
     EXPECT_EQ(instance->ft->setProperty(instance, "Length", chars("x"), CMPI_chars).rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);

@@ -55,13 +55,13 @@ protected:
 };
 
 TEST_P(ManagerTest, VersionZeroAndMissingFunctionsAreAccepted) {
-    broker.poseAs(Manager::sfcb);
+    broker.emulate(Manager::sfcb);
     ASSERT_EQ(broker.handle()->bft->brokerVersion, 0);
     expectAllRequestsServed();
 }
 
 TEST_P(ManagerTest, AMissingMemoryTableIsAccepted) {
-    broker.poseAs(Manager::openPegasus);
+    broker.emulate(Manager::openPegasus);
     ASSERT_EQ(broker.handle()->mft, nullptr);
     expectAllRequestsServed();
 }

@@ -1,0 +1,186 @@
+#include "broker/Convert.h"
+#include "broker/DateTimes.h"
+#include "broker/Encapsulation.h"
+#include "broker/FunctionTables.h"
+#include "broker/NamedValues.h"
+
+// The encapsulated objects that only hold values: strings, datetimes, arrays, enumerations, arguments, contexts.
+
+namespace cimhost {
+namespace {
+
+// CMPIString.
+
+const char* getCharPtr(const CMPIString* string, CMPIStatus* rc) {
+    return guarded<const char*>(rc, nullptr, [&]() -> const char* {
+        const auto& object = self(string);
+        return object.lacksCharacters ? nullptr : object.content->c_str();
+    });
+}
+
+// CMPIDateTime.
+
+/** A time before 1970 comes as the two's complement of the microseconds until then. */
+CMPIUint64 getBinaryFormat(const CMPIDateTime* time, CMPIStatus* rc) {
+    return guarded<CMPIUint64>(rc, 0, [&] {
+        const std::optional<std::int64_t> binary = microseconds(content(time).text);
+        if (!binary) {
+            throw Failure(CMPI_RC_ERR_FAILED, "A datetime with unknown fields has no binary form.");
+        }
+        return static_cast<CMPIUint64>(*binary);
+    });
+}
+
+CMPIString* getStringFormat(const CMPIDateTime* time, CMPIStatus* rc) {
+    return guarded<CMPIString*>(rc, nullptr, [&] {
+        const auto& object = self(time);
+        return arenaFor(object).make<CMPIString>(object.content->text);
+    });
+}
+
+CMPIBoolean isIntervalTime(const CMPIDateTime* time, CMPIStatus* rc) {
+    return guarded<CMPIBoolean>(rc, 0,
+                                [&] { return static_cast<CMPIBoolean>(isInterval(content(time).text) ? 1 : 0); });
+}
+
+// CMPIArray.
+
+/** The element at that position. Failure with CMPI_RC_ERR_NO_SUCH_PROPERTY when there is none. */
+Scalar& elementAt(ArrayContent& array, CMPICount index) {
+    if (index >= array.elements.size()) {
+        throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY);
+    }
+    return array.elements[index];
+}
+
+CMPICount getSize(const CMPIArray* array, CMPIStatus* rc) {
+    return guarded<CMPICount>(rc, 0, [&] { return static_cast<CMPICount>(content(array).elements.size()); });
+}
+
+CMPIType getSimpleType(const CMPIArray* array, CMPIStatus* rc) {
+    return guarded<CMPIType>(rc, CMPI_null, [&] { return content(array).type; });
+}
+
+CMPIData getElementAt(const CMPIArray* array, CMPICount index, CMPIStatus* rc) {
+    return guarded(rc, badData(), [&] {
+        auto& object = self(array);
+        return dataFrom(elementAt(*object.content, index), object.content->type, arenaFor(object));
+    });
+}
+
+CMPIStatus setElementAt(CMPIArray* array, CMPICount index, const CMPIValue* value, CMPIType type) {
+    return guarded([&] {
+        ArrayContent& target = content(array);
+        Scalar& element = elementAt(target, index);
+        if (type != CMPI_null && ((type & CMPI_ARRAY) != 0 || elementType(type) != target.type)) {
+            throw Failure(CMPI_RC_ERR_TYPE_MISMATCH);
+        }
+        element = scalarFrom(value, type);
+    });
+}
+
+// CMPIEnumeration.
+
+CMPIData getNext(const CMPIEnumeration* enumeration, CMPIStatus* rc) {
+    return guarded(rc, badData(), [&] {
+        auto& object = self(enumeration);
+        EnumerationContent& from = *object.content;
+        if (from.taken >= from.elements.size()) {
+            throw Failure(CMPI_RC_ERR_FAILED, "The enumeration has no more elements.");
+        }
+        return dataFrom(from.elements[from.taken++], from.type, arenaFor(object));
+    });
+}
+
+CMPIBoolean hasNext(const CMPIEnumeration* enumeration, CMPIStatus* rc) {
+    return guarded<CMPIBoolean>(rc, 0, [&] {
+        const EnumerationContent& from = content(enumeration);
+        return static_cast<CMPIBoolean>(from.taken < from.elements.size() ? 1 : 0);
+    });
+}
+
+/** All elements, also those taken already; the enumeration stays where it is. */
+CMPIArray* toArray(const CMPIEnumeration* enumeration, CMPIStatus* rc) {
+    return guarded<CMPIArray*>(rc, nullptr, [&] {
+        const auto& object = self(enumeration);
+        return arenaFor(object).make<CMPIArray>({object.content->type, object.content->elements});
+    });
+}
+
+// CMPIArgs.
+
+CMPIStatus addArg(const CMPIArgs* args, const char* name, const CMPIValue* value, const CMPIType type) {
+    return guarded([&] {
+        ArgsContent& target = content(args);
+        const std::string argumentName = argument(name);
+        setNamed(target.values, argumentName, valueFrom(value, type));
+    });
+}
+
+CMPIData getArg(const CMPIArgs* args, const char* name, CMPIStatus* rc) {
+    return guarded(rc, badData(), [&] {
+        const auto& object = self(args);
+        return namedData(object.content->values, name, arenaFor(object));
+    });
+}
+
+CMPIData getArgAt(const CMPIArgs* args, CMPICount index, CMPIString** name, CMPIStatus* rc) {
+    return guarded(rc, badData(), [&] {
+        const auto& object = self(args);
+        return namedDataAt(object.content->values, index, name, arenaFor(object));
+    });
+}
+
+CMPICount getArgCount(const CMPIArgs* args, CMPIStatus* rc) {
+    return guarded<CMPICount>(rc, 0, [&] { return static_cast<CMPICount>(content(args).values.size()); });
+}
+
+// CMPIContext.
+
+CMPIData getEntry(const CMPIContext* context, const char* name, CMPIStatus* rc) {
+    return guarded(rc, badData(), [&] {
+        const auto& object = self(context);
+        return namedData(object.content->entries, name, arenaFor(object));
+    });
+}
+
+CMPIData getEntryAt(const CMPIContext* context, CMPICount index, CMPIString** name, CMPIStatus* rc) {
+    return guarded(rc, badData(), [&] {
+        const auto& object = self(context);
+        return namedDataAt(object.content->entries, index, name, arenaFor(object));
+    });
+}
+
+CMPICount getEntryCount(const CMPIContext* context, CMPIStatus* rc) {
+    return guarded<CMPICount>(rc, 0, [&] { return static_cast<CMPICount>(content(context).entries.size()); });
+}
+
+CMPIStatus addEntry(const CMPIContext* context, const char* name, const CMPIValue* value, const CMPIType type) {
+    return guarded([&] {
+        ContextContent& target = content(context);
+        const std::string entryName = argument(name);
+        setNamed(target.entries, entryName, valueFrom(value, type));
+    });
+}
+
+}  // namespace
+
+const CMPIStringFT stringTable{tableVersion, releaseObject<CMPIString>, cloneObject<CMPIString>, getCharPtr};
+
+const CMPIDateTimeFT dateTimeTable{
+    tableVersion,  releaseObject<CMPIDateTime>, cloneObject<CMPIDateTime>, getBinaryFormat, getStringFormat,
+    isIntervalTime};
+
+const CMPIArrayFT arrayTable{
+    tableVersion, releaseObject<CMPIArray>, cloneObject<CMPIArray>, getSize, getSimpleType, getElementAt, setElementAt};
+
+const CMPIEnumerationFT enumerationTable{
+    tableVersion, releaseObject<CMPIEnumeration>, cloneObject<CMPIEnumeration>, getNext, hasNext, toArray};
+
+const CMPIArgsFT argsTable{tableVersion, releaseObject<CMPIArgs>, cloneObject<CMPIArgs>, addArg, getArg, getArgAt,
+                           getArgCount};
+
+const CMPIContextFT contextTable{
+    tableVersion, releaseObject<CMPIContext>, cloneObject<CMPIContext>, getEntry, getEntryAt, getEntryCount, addEntry};
+
+}  // namespace cimhost

@@ -1,0 +1,53 @@
+#pragma once
+
+#include <string>
+#include <vector>
+
+#include "cli/TextLayout.h"
+#include "model/Response.h"
+#include "schema/Registration.h"
+#include "schema/Schema.h"
+
+namespace cimhost {
+
+/** A class and its providers. */
+struct ListedClass {
+    std::string name{};
+    const Class* definition = nullptr;  ///< null for a class that is registered but not in the schema
+    std::vector<ProviderRegistration> providers{};
+};
+
+}  // namespace cimhost
+
+/** Output for people. Control characters in data are escaped, so that they cannot steer a terminal. */
+namespace cimhost::text {
+
+/** The path, then one line per property: name, type, value. Instances are separated by an empty line. */
+std::string format(const std::vector<Instance>& instances, const Style& style);
+
+/** One path per line. */
+std::string format(const std::vector<ObjectPath>& paths, const Style& style);
+
+/** Per provider: its status, everything that it returned, numbered, and how often it called returnDone. */
+std::string format(const std::vector<ProviderResponse>& responses, const Style& style);
+
+/** One line per class and provider: class, interfaces, provider, library, namespaces. */
+std::string format(const std::vector<ListedClass>& classes, const Style& style);
+
+}  // namespace cimhost::text
+
+/**
+ * Output for programs, one JSON document with a line feed at the end. Properties and keys stay in their order; each
+ * has its CIM type, whether it is an array, and its value, null where it is null. Bytes that are no UTF-8 become
+ * U+FFFD. docs/cimhost.md shows the shapes.
+ */
+namespace cimhost::json {
+
+std::string format(const std::vector<Instance>& instances);
+std::string format(const Instance& instance);
+std::string format(const std::vector<ObjectPath>& paths);
+std::string format(const ObjectPath& path);
+std::string format(const std::vector<ProviderResponse>& responses);
+std::string format(const std::vector<ListedClass>& classes);
+
+}  // namespace cimhost::json

@@ -1,0 +1,209 @@
+#include "cli/TextLayout.h"
+
+#include <sys/ioctl.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <charconv>
+#include <clocale>
+#include <cstdlib>
+#include <cwchar>
+#include <utility>
+
+namespace cimhost::text {
+namespace {
+
+std::string_view variable(const char* name) {
+    const char* value = ::secure_getenv(name);
+    return value == nullptr ? std::string_view() : std::string_view(value);
+}
+
+std::size_t widthOf(int descriptor) {
+    const std::string_view columns = variable("COLUMNS");
+    std::size_t width = 0;
+    const auto [end, error] = std::from_chars(columns.data(), columns.data() + columns.size(), width);
+    if (error == std::errc() && end == columns.data() + columns.size() && width > 0) {
+        return width;
+    }
+    winsize window{};
+    return ioctl(descriptor, TIOCGWINSZ, &window) == 0 ? window.ws_col : 0;
+}
+
+const char* codeOf(Role role) {
+    switch (role) {
+        case Role::heading:
+            return "1";  // bold
+        case Role::name:
+            return "36";  // cyan
+        case Role::detail:
+            return "2";  // faint
+        case Role::alarm:
+            return "1;31";  // bold, red
+        default:
+            return nullptr;
+    }
+}
+
+/** Has the C library take texts for UTF-8 while it lives, whatever the user's locale is. */
+class Utf8 {
+public:
+    Utf8() : before(uselocale(utf8())) {}
+    ~Utf8() { uselocale(before); }
+    Utf8(const Utf8&) = delete;
+    Utf8& operator=(const Utf8&) = delete;
+
+private:
+    static locale_t utf8() {
+        static const locale_t locale = newlocale(LC_CTYPE_MASK, "C.UTF-8", nullptr);
+        return locale;  // without it, uselocale leaves all as it is, and bytes are counted
+    }
+
+    locale_t before;
+};
+
+constexpr std::size_t gap = 2;              ///< blanks between columns
+constexpr std::size_t leastLastWidth = 16;  ///< less is no room for the last column
+
+/** Where the part of a text ends that begins at a place and has room: behind its last blank, if it has one. */
+std::size_t endOfPart(const std::string& text, std::size_t begin, std::size_t room) {
+    std::size_t afterBlank = begin;
+    std::size_t width = 0;
+    for (std::size_t at = begin; at < text.size();) {
+        const Character next = firstCharacter(std::string_view(text).substr(at));
+        width += next.columns;
+        if (width > room && at > begin) {
+            return afterBlank > begin ? afterBlank : at;
+        }
+        at += next.bytes;
+        afterBlank = text[at - 1] == ' ' ? at : afterBlank;
+    }
+    return text.size();
+}
+
+/** The text in parts that have room; put together, they are the text. */
+std::vector<std::string> parts(const std::string& text, std::size_t room) {
+    std::vector<std::string> found;
+    for (std::size_t begin = 0; begin < text.size();) {
+        const std::size_t end = room == 0 ? text.size() : endOfPart(text, begin, room);
+        found.push_back(text.substr(begin, end - begin));
+        begin = end;
+    }
+    return found;
+}
+
+/** Lays rows out; its widths are those of the columns but the last. */
+class Layout {
+public:
+    Layout(const std::vector<Row>& rows, std::string itsIndent, const Style& itsStyle,
+           const std::vector<Role>& itsRoles)
+        : indent(std::move(itsIndent)), style(itsStyle), roles(itsRoles) {
+        std::size_t last = 0;
+        for (const Row& row : rows) {
+            widths.resize(std::max(widths.size(), row.size()));
+            for (std::size_t i = 0; i < row.size(); ++i) {
+                widths[i] = std::max(widths[i], columnsOf(row[i]));
+            }
+        }
+        if (!widths.empty()) {
+            last = widths.back();
+            widths.pop_back();
+        }
+        for (const std::size_t width : widths) {
+            lastBegins += width + gap;
+        }
+        isNarrow = style.width != 0 && lastBegins + std::min(last, leastLastWidth) > style.width;
+    }
+
+    std::string text(const Row& row) const { return row.empty() ? "\n" : isNarrow ? stacked(row) : sideBySide(row); }
+
+private:
+    std::string cell(const Row& row, std::size_t column, const std::string& content) const {
+        return painted(content, column < roles.size() && column < row.size() ? roles[column] : Role::plain, style);
+    }
+
+    std::string sideBySide(const Row& row) const {
+        std::string line = indent;
+        for (std::size_t i = 0; i + 1 < row.size(); ++i) {
+            line += cell(row, i, row[i]) + std::string(widths[i] - columnsOf(row[i]) + gap, ' ');
+        }
+        const bool hasLast = row.size() == widths.size() + 1;
+        return line + below(row, row.size() - 1, hasLast ? lastBegins : 0);
+    }
+
+    std::string stacked(const Row& row) const {
+        std::string lines = indent + cell(row, 0, row.front()) + "\n";
+        const std::string deeper = indent + std::string(gap, ' ');
+        for (std::size_t i = 1; i < row.size(); ++i) {
+            lines += deeper + below(row, i, deeper.size());
+        }
+        return lines;
+    }
+
+    /** A cell that goes on below where it begins. */
+    std::string below(const Row& row, std::size_t column, std::size_t begins) const {
+        const std::size_t room = style.width > begins && begins != 0 ? style.width - begins : 0;
+        std::string lines;
+        for (const std::string& part : parts(row[column], room)) {
+            lines += (lines.empty() ? "" : std::string(begins, ' ')) + cell(row, column, part) + "\n";
+        }
+        return lines.empty() ? "\n" : lines;
+    }
+
+    std::string indent;
+    const Style& style;
+    const std::vector<Role>& roles;
+    std::vector<std::size_t> widths{};
+    std::size_t lastBegins = indent.size();
+    bool isNarrow = false;
+};
+
+}  // namespace
+
+Style styleFor(int descriptor, Colours mode) {
+    const bool isTerminal = isatty(descriptor) == 1;
+    const bool wanted = isTerminal && variable("NO_COLOR").empty() && variable("TERM") != "dumb";
+    Style style;
+    style.colours = mode == Colours::always || (mode == Colours::automatic && wanted);
+    style.width = isTerminal ? widthOf(descriptor) : 0;
+    return style;
+}
+
+std::string painted(const std::string& text, Role role, const Style& style) {
+    const char* code = codeOf(role);
+    return style.colours && code != nullptr && !text.empty() ? "\033[" + std::string(code) + "m" + text + "\033[0m"
+                                                             : text;
+}
+
+Character firstCharacter(std::string_view text) {
+    const Utf8 utf8;
+    std::mbstate_t state{};
+    wchar_t character{};
+    const std::size_t bytes = std::mbrtowc(&character, text.data(), text.size(), &state);
+    if (bytes == 0 || bytes > text.size()) {
+        return {1, 1};
+    }
+    const int columns = ::wcwidth(character);
+    return {bytes, columns < 0 ? 1 : static_cast<std::size_t>(columns)};
+}
+
+std::size_t columnsOf(std::string_view text) {
+    std::size_t columns = 0;
+    while (!text.empty()) {
+        const Character first = firstCharacter(text);
+        columns += first.columns;
+        text.remove_prefix(first.bytes);
+    }
+    return columns;
+}
+
+std::string aligned(const std::vector<Row>& rows, const std::string& indent, const Style& style,
+                    const std::vector<Role>& roles) {
+    const Layout layout(rows, indent, style, roles);
+    std::string text;
+    for (const Row& row : rows) {
+        text += layout.text(row);
+    }
+    return text;
+}
+
+}  // namespace cimhost::text

@@ -1,0 +1,92 @@
+#pragma once
+
+#include <optional>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include "model/Value.h"
+
+namespace cimhost {
+
+/** The CIM operations: those that this host sends to providers, then those that only a provider's up-call can name. */
+enum class Operation {
+    enumerateInstances,
+    enumerateInstanceNames,
+    getInstance,
+    createInstance,
+    modifyInstance,
+    deleteInstance,
+    execQuery,
+    associators,
+    associatorNames,
+    references,
+    referenceNames,
+    invokeMethod,
+    setProperty,
+    getProperty
+};
+
+/** The name of the operation in the standard, such as "EnumerateInstances". */
+const char* nameOf(Operation operation);
+
+/** Whether association providers serve it: associators, references and the operations that return their names. */
+bool isAssociationOperation(Operation operation);
+
+/** References or their names. */
+bool isReferenceOperation(Operation operation);
+
+/** Whether its results are object paths, not instances. */
+bool returnsPaths(Operation operation);
+
+/** Names of the properties that a request is about; none means all of them, an empty list none of them. */
+using PropertyList = std::optional<std::vector<std::string>>;
+
+/** The entries of a request's context, such as CMPIInvocationFlags and CMPIPrincipal. */
+using ContextEntries = std::vector<NamedValue>;
+
+/** Names that narrow down an association operation; none where the client sent none. */
+struct AssociationFilter {
+    std::optional<std::string> associationClass{};  ///< not for references, whose result class is the association
+    std::optional<std::string> resultClass{};
+    std::optional<std::string> role{};
+    std::optional<std::string> resultRole{};  ///< not for references
+};
+
+/** One CIM operation with its arguments. Members that the operation does not use keep their defaults. */
+struct Request {
+    Operation operation = Operation::enumerateInstances;
+    ObjectPath path{};
+    PropertyList properties{};
+    Instance instance{};         ///< of createInstance and modifyInstance
+    AssociationFilter filter{};  ///< of the association operations
+    ContextEntries context{};
+    std::string language{};  ///< of execQuery, as query
+    std::string query{};
+    std::string member{};             ///< the method of invokeMethod; the property of setProperty and getProperty
+    Value value{};                    ///< of setProperty
+    std::vector<NamedValue> input{};  ///< parameters of invokeMethod
+
+    /** @name One function per operation */
+    ///@{
+    static Request enumerateInstances(ObjectPath path, PropertyList properties = {});
+    static Request enumerateInstanceNames(ObjectPath path);
+    static Request getInstance(ObjectPath path, PropertyList properties = {});
+    static Request createInstance(ObjectPath path, Instance instance);
+    static Request modifyInstance(ObjectPath path, Instance instance, PropertyList properties = {});
+    static Request deleteInstance(ObjectPath path);
+    static Request execQuery(ObjectPath path, std::string language, std::string query);
+    static Request associators(ObjectPath path, AssociationFilter filter, PropertyList properties = {});
+    static Request associatorNames(ObjectPath path, AssociationFilter filter);
+    static Request references(ObjectPath path, AssociationFilter filter, PropertyList properties = {});
+    static Request referenceNames(ObjectPath path, AssociationFilter filter);
+    static Request invokeMethod(ObjectPath path, std::string method, std::vector<NamedValue> input);
+    static Request setProperty(ObjectPath path, std::string property, Value value);
+    static Request getProperty(ObjectPath path, std::string property);
+    ///@}
+
+    /** The same request with that context. */
+    Request with(ContextEntries entries) const;
+};
+
+}  // namespace cimhost

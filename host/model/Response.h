@@ -1,0 +1,71 @@
+#pragma once
+
+#include <algorithm>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include "model/ResultEvent.h"
+#include "model/Status.h"
+#include "model/Value.h"
+
+namespace cimhost {
+
+/** Everything that one provider did in response to a request. */
+struct ProviderResponse {
+    Status status{};            ///< as the provider returned it; CMPI_RC_ERR_FAILED when an exception left it
+    bool hasMessage = false;    ///< whether the status carried a message, even an empty one
+    bool threw = false;         ///< whether an exception left the provider
+    bool releasedPath = false;  ///< whether the provider released a path that the result keeps
+    ResultEvents events{};      ///< what it returned, in order, also before a failure
+    std::string crashReason{};  ///< why the manager's provider process would have ended, a sentence; empty if it lives
+
+    int doneCount() const { return cimhost::doneCount(events); }
+};
+
+/** What the client of a request receives, and the responses of the providers that it is made of. */
+struct Response {
+    Status status{};                            ///< OK, or a code with a message; then the results are empty
+    std::vector<Instance> instances{};          ///< results that are instances; one for getInstance
+    std::vector<ObjectPath> paths{};            ///< results that are paths; one for createInstance
+    Value value{};                              ///< result of invokeMethod or getProperty
+    std::vector<NamedValue> output{};           ///< output parameters of invokeMethod
+    std::vector<ProviderResponse> providers{};  ///< one per provider that was called
+
+    static Response failed(Status status) {
+        Response response;
+        response.status = std::move(status);
+        return response;
+    }
+    static Response ofInstances(std::vector<Instance> instances) {
+        Response response;
+        response.instances = std::move(instances);
+        return response;
+    }
+    static Response ofPaths(std::vector<ObjectPath> paths) {
+        Response response;
+        response.paths = std::move(paths);
+        return response;
+    }
+    static Response ofValue(Value value, std::vector<NamedValue> output = {}) {
+        Response response;
+        response.value = std::move(value);
+        response.output = std::move(output);
+        return response;
+    }
+
+    bool ok() const { return status.ok(); }
+
+    /** The first result; an empty one if there is none. */
+    Instance instance() const { return instances.empty() ? Instance{} : instances.front(); }
+    ObjectPath path() const { return paths.empty() ? ObjectPath{} : paths.front(); }
+
+    /** The reason of the first provider whose process would have ended; empty if there is none. */
+    std::string crashReason() const {
+        const auto found = std::find_if(providers.begin(), providers.end(),
+                                        [](const ProviderResponse& each) { return !each.crashReason.empty(); });
+        return found == providers.end() ? std::string{} : found->crashReason;
+    }
+};
+
+}  // namespace cimhost

@@ -1,0 +1,57 @@
+#include "operations/ManagerBehaviour.h"
+
+namespace cimhost {
+namespace {
+
+/** The provider's message, that of an extended error that it returned, or else the code. */
+std::string messageOf(const ProviderResponse& response, Operation operation) {
+    if (!response.status.message.empty()) {
+        return response.status.message;
+    }
+    for (const ErrorInfo& error : eventsOf<ErrorInfo>(response.events)) {
+        if (error.message) {
+            return *error.message;
+        }
+    }
+    return std::string("The provider answered ") + nameOf(operation) + " with code " +
+           std::to_string(response.status.rc) + " and no message.";
+}
+
+}  // namespace
+
+const ManagerBehaviour& ManagerBehaviour::standard() {
+    static const ManagerBehaviour behaviour;
+    return behaviour;
+}
+
+Status ManagerBehaviour::coerceTypes(Request&, const Broker&) const {
+    return {};
+}
+
+void ManagerBehaviour::adapt(Request&, const Broker&) const {}
+
+ResultRules ManagerBehaviour::resultRules(Operation) const {
+    return {};
+}
+
+std::string ManagerBehaviour::crashReason(const ProviderResponse&, Operation) const {
+    return {};
+}
+
+Status ManagerBehaviour::statusOf(const ProviderResponse& response, Operation operation) const {
+    return response.status.ok() ? Status{} : Status{response.status.rc, messageOf(response, operation)};
+}
+
+Answer<ObjectPath> ManagerBehaviour::createdPath(const ProviderResponse& response) const {
+    for (const ResultEvent& event : response.events) {
+        if (const auto* path = std::get_if<ObjectPath>(&event)) {
+            return {{}, *path};
+        }
+        if (const auto* instance = std::get_if<Instance>(&event)) {
+            return {{}, instance->path};
+        }
+    }
+    return {{CMPI_RC_ERR_FAILED, "The provider accepted CreateInstance, but returned neither path nor instance."}, {}};
+}
+
+}  // namespace cimhost

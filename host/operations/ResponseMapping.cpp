@@ -1,0 +1,97 @@
+#include "operations/ResponseMapping.h"
+
+#include <algorithm>
+#include <utility>
+
+#include "schema/ObjectPathText.h"
+
+namespace cimhost {
+namespace {
+
+Status statusOf(const ManagerBehaviour& behaviour, const std::vector<ProviderResponse>& responses,
+                Operation operation) {
+    std::vector<Status> all;
+    all.reserve(responses.size());
+    for (const ProviderResponse& response : responses) {
+        all.push_back(behaviour.statusOf(response, operation));
+    }
+    const bool anyOk = std::any_of(all.begin(), all.end(), [](const Status& each) { return each.ok(); });
+    const auto failed = std::find_if(all.begin(), all.end(), [&](const Status& each) {
+        return !each.ok() && !(anyOk && each.rc == CMPI_RC_ERR_NOT_SUPPORTED);
+    });
+    return failed == all.end() ? Status{} : *failed;
+}
+
+template <class Kind>
+constexpr const char* kindName = "instance";
+template <>
+constexpr const char* kindName<ObjectPath> = "object path";
+
+/** Whether the event is of that kind, or one that every operation may have. */
+template <class Kind>
+bool isExpected(const ResultEvent& event) {
+    return std::holds_alternative<Kind>(event) || std::holds_alternative<Done>(event) ||
+           std::holds_alternative<ErrorInfo>(event) || std::holds_alternative<NullResult>(event);
+}
+
+/** Appends all results of that kind. */
+template <class Kind>
+Status collect(const std::vector<ProviderResponse>& responses, Operation operation, std::vector<Kind>& results) {
+    for (const ProviderResponse& response : responses) {
+        if (!std::all_of(response.events.begin(), response.events.end(), isExpected<Kind>)) {
+            results.clear();
+            return {CMPI_RC_ERR_FAILED, std::string("The provider answered ") + nameOf(operation) +
+                                            " with something other than an " + kindName<Kind> + "."};
+        }
+        const std::vector<Kind> found = eventsOf<Kind>(response.events);
+        results.insert(results.end(), found.begin(), found.end());
+    }
+    return {};
+}
+
+Status collectOne(const Request& request, Response& response) {
+    Status status = collect(response.providers, request.operation, response.instances);
+    if (status.ok() && response.instances.empty()) {
+        return {CMPI_RC_ERR_NOT_FOUND, "There is no instance " + formatObjectPath(request.path) + "."};
+    }
+    response.instances.resize(std::min<std::size_t>(response.instances.size(), 1));
+    return status;
+}
+
+Status collectCreated(const ManagerBehaviour& behaviour, Response& response) {
+    Answer<ObjectPath> created = behaviour.createdPath(response.providers.front());
+    if (created.ok()) {
+        response.paths.push_back(std::move(created.value));
+    }
+    return created.status;
+}
+
+Status collectResults(const ManagerBehaviour& behaviour, const Request& request, Response& response) {
+    switch (request.operation) {
+        case Operation::getInstance:
+            return collectOne(request, response);
+        case Operation::createInstance:
+            return collectCreated(behaviour, response);
+        case Operation::modifyInstance:
+        case Operation::deleteInstance:
+            return {};
+        default:
+            return returnsPaths(request.operation) ? collect(response.providers, request.operation, response.paths)
+                                                   : collect(response.providers, request.operation, response.instances);
+    }
+}
+
+}  // namespace
+
+Response mapResponses(const ManagerBehaviour& behaviour, const Request& request,
+                      std::vector<ProviderResponse> responses) {
+    Response response;
+    response.providers = std::move(responses);
+    response.status = statusOf(behaviour, response.providers, request.operation);
+    if (response.ok()) {
+        response.status = collectResults(behaviour, request, response);
+    }
+    return response;
+}
+
+}  // namespace cimhost

@@ -1,0 +1,25 @@
+#pragma once
+
+#include <functional>
+#include <memory>
+
+#include "lab/emulation/RequestAdaptation.h"
+#include "operations/ManagerBehaviour.h"
+
+// The single emulations, and what they share.
+
+namespace cimhost::lab {
+
+std::shared_ptr<const ManagerBehaviour> sfcbEmulation();
+std::shared_ptr<const ManagerBehaviour> openPegasusEmulation(CreationKey creationKey);
+
+/** Versions and gaps of SFCB's tables. */
+void changeToSfcbTables(FunctionTables& tables);
+
+/** Runs the body on a new thread, which belongs to the caller's chain of requests; rethrows what it throws. */
+void onNewThread(const std::function<void()>& body);
+
+/** The status of a request that would have ended the manager's provider process. */
+Status crashed(const std::string& reason);
+
+}  // namespace cimhost::lab

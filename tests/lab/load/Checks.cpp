@@ -1,0 +1,119 @@
+#include "lab/load/Checks.h"
+
+#include <algorithm>
+
+#include "broker/NamedValues.h"
+#include "lab/load/Values.h"
+#include "operations/StatusText.h"
+#include "schema/MofWriter.h"
+#include "schema/Names.h"
+#include "schema/ObjectPathText.h"
+#include "schema/Text.h"
+
+namespace cimhost::lab {
+namespace {
+
+bool beginsWith(const std::string& text, const std::string& beginning) {
+    return text.compare(0, beginning.size(), beginning) == 0;
+}
+
+std::string textOf(const Status& status) {
+    return status.ok() ? "OK" : errorText(status);
+}
+
+std::optional<std::string> idOf(const LoadClass& known, const Instance& instance) {
+    const std::optional<std::string> inPath = known.idIn(instance.path.keys);
+    return inPath ? inPath : known.idIn(instance.properties);
+}
+
+/** One of many: at most one is wrong in it. */
+Verdict checkListed(const Expectation& expectation, const std::string& id, const Instance* instance) {
+    const auto& known = expectation.ledger.instances();
+    const auto found = known.find(id);
+    if (found != known.end()) {
+        return instance == nullptr ? std::nullopt : checkInstance(expectation.known, *instance, id, found->second);
+    }
+    if (beginsWith(id, expectation.own)) {
+        return expectation.ledger.isDoubtful(id)
+                   ? std::nullopt
+                   : Verdict(Wrong{"ghost", "no instance " + id, "one that is not deleted"});
+    }
+    const bool isAllowed = beginsWith(id, expectation.any) || expectation.others.count(id) != 0;
+    return isAllowed ? std::nullopt : Verdict(Wrong{"stranger", "only instances that somebody made", inQuotes(id)});
+}
+
+template <class Ids, class IdOf>
+Verdict checkNoneMissing(const Ids& ids, const std::set<std::string>& listed, IdOf idOf) {
+    const auto missing =
+        std::find_if(ids.begin(), ids.end(), [&](const auto& each) { return listed.count(idOf(each)) == 0; });
+    return missing == ids.end() ? std::nullopt
+                                : Verdict(Wrong{"missing", "instance " + idOf(*missing),
+                                                "only " + std::to_string(listed.size()) + " others"});
+}
+
+}  // namespace
+
+Verdict checkStatus(const Status& status, int code) {
+    if (status.rc == code) {
+        return std::nullopt;
+    }
+    return Wrong{"status", code == CMPI_RC_OK ? "OK" : codeName(code), textOf(status)};
+}
+
+Verdict checkPath(const ObjectPath& created, const ObjectPath& expected) {
+    const bool isSame = sameName(created.className, expected.className) && created.keys.size() == 1 &&
+                        sameName(created.keys.front().name, expected.keys.front().name) &&
+                        sameValue(created.keys.front().value, expected.keys.front().value);
+    if (isSame) {
+        return std::nullopt;
+    }
+    return Wrong{"path", formatObjectPath(expected), formatObjectPath(created)};
+}
+
+Verdict checkInstance(const LoadClass& known, const Instance& instance, const std::string& id,
+                      const Ledger::Values& values) {
+    const std::optional<std::string> inPath = known.idIn(instance.path.keys);
+    const std::optional<std::string> inProperties = known.idIn(instance.properties);
+    if (inPath.value_or(id) != id || inProperties.value_or(id) != id || (!inPath && !inProperties)) {
+        return Wrong{"value", known.key + " = " + inQuotes(id), formatObjectPath(instance.path)};
+    }
+    for (const auto& [name, value] : values) {
+        const NamedValue* found = findNamed(instance.properties, name);
+        if (found == nullptr || !sameValue(found->value, value)) {
+            return Wrong{"value", name + " = " + formatMof(value),
+                         found == nullptr ? "none" : name + " = " + formatMof(found->value)};
+        }
+    }
+    return std::nullopt;
+}
+
+Verdict checkListing(const Expectation& expectation, const std::vector<Instance>& instances, bool hasProperties) {
+    std::set<std::string> listed;
+    for (const Instance& instance : instances) {
+        const std::optional<std::string> id = idOf(expectation.known, instance);
+        if (!id || id->empty()) {
+            return Wrong{"nameless", "instances with a key", formatObjectPath(instance.path)};
+        }
+        if (!listed.insert(*id).second) {
+            return Wrong{"duplicate", "instance " + *id + " once", "more than once"};
+        }
+        Verdict verdict = checkListed(expectation, *id, hasProperties ? &instance : nullptr);
+        if (verdict) {
+            return verdict;
+        }
+    }
+    Verdict verdict = checkNoneMissing(expectation.others, listed, [](const std::string& id) { return id; });
+    return verdict ? verdict : checkNoneMissing(expectation.ledger.instances(), listed, [](const auto& instance) {
+        return instance.first;
+    });
+}
+
+Verdict checkAssociated(const std::vector<std::string>& now, const std::vector<std::string>& before) {
+    const auto listed = [](const std::vector<std::string>& paths) {
+        return paths.empty() ? "nothing"
+                             : std::to_string(paths.size()) + ": " + paths.front() + (paths.size() > 1 ? "..." : "");
+    };
+    return now == before ? std::nullopt : Verdict(Wrong{"association", listed(before), listed(now)});
+}
+
+}  // namespace cimhost::lab

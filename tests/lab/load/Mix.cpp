@@ -1,0 +1,64 @@
+#include "lab/load/Mix.h"
+
+#include <algorithm>
+#include <charconv>
+#include <iterator>
+#include <numeric>
+#include <sstream>
+
+namespace cimhost::lab {
+namespace {
+
+constexpr std::array<const char*, deedCount> names{"create", "modify", "delete", "enumerate", "get", "associate"};
+constexpr std::array<unsigned, deedCount> usualWeights{20, 25, 15, 5, 35, 0};
+
+std::size_t deedNamed(const std::string& name) {
+    const auto* const found = std::find(names.begin(), names.end(), name);
+    if (found == names.end()) {
+        throw PlanError(name + " is not one of create, modify, delete, enumerate, get and associate");
+    }
+    return static_cast<std::size_t>(std::distance(names.begin(), found));
+}
+
+unsigned weightFrom(const std::string& text) {
+    unsigned weight = 0;
+    const char* end = text.data() + text.size();
+    const auto read = std::from_chars(text.data(), end, weight);
+    if (text.empty() || read.ec != std::errc() || read.ptr != end || weight > 1'000'000) {
+        throw PlanError("'" + text + "' is no weight; write a number up to 1000000");
+    }
+    return weight;
+}
+
+}  // namespace
+
+const char* nameOf(Deed deed) {
+    return names[static_cast<std::size_t>(deed)];
+}
+
+Mix::Mix() : weights(usualWeights) {}
+
+Mix::Mix(const std::string& text) {
+    std::istringstream parts(text);
+    for (std::string part; std::getline(parts, part, ',');) {
+        const std::size_t equals = part.find('=');
+        if (equals == std::string::npos) {
+            throw PlanError("'" + part + "' is no NAME=WEIGHT, such as create=2");
+        }
+        weights[deedNamed(part.substr(0, equals))] = weightFrom(part.substr(equals + 1));
+    }
+    if (std::all_of(weights.begin(), weights.end(), [](unsigned each) { return each == 0; })) {
+        throw PlanError("there is nothing to do in the mix '" + text + "'");
+    }
+}
+
+Deed Mix::pick(Random& random) const {
+    std::uint64_t left = random.below(std::accumulate(weights.begin(), weights.end(), std::uint64_t{0}));
+    std::size_t deed = 0;
+    while (left >= weights[deed]) {
+        left -= weights[deed++];
+    }
+    return static_cast<Deed>(deed);
+}
+
+}  // namespace cimhost::lab

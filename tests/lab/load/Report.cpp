@@ -1,0 +1,94 @@
+#include "lab/load/Report.h"
+
+#include <algorithm>
+#include <cmath>
+#include <numeric>
+#include <tuple>
+
+namespace cimhost::lab {
+namespace {
+
+Figures figuresOf(std::string name, std::vector<Tally::Time> times, std::size_t wrong, double seconds) {
+    std::sort(times.begin(), times.end());
+    return {std::move(name),
+            times.size(),
+            wrong,
+            seconds > 0 ? static_cast<double>(times.size()) / seconds : 0,
+            percentile(times, 0.5),
+            percentile(times, 0.95),
+            percentile(times, 0.99),
+            percentile(times, 1)};
+}
+
+}  // namespace
+
+void Tally::count(Deed deed, Time time, bool isWrong) {
+    OfDeed& target = deeds[static_cast<std::size_t>(deed)];
+    target.times.push_back(time);
+    target.wrong += isWrong ? 1 : 0;
+}
+
+void Tally::note(WrongAnswer answer) {
+    ++wrongByKind[answer.wrong.kind];
+    if (answers.size() < shown) {
+        answers.push_back(std::move(answer));
+    }
+}
+
+void Tally::add(const Tally& other) {
+    for (std::size_t i = 0; i < deedCount; ++i) {
+        deeds[i].times.insert(deeds[i].times.end(), other.deeds[i].times.begin(), other.deeds[i].times.end());
+        deeds[i].wrong += other.deeds[i].wrong;
+    }
+    for (const auto& [kind, count] : other.wrongByKind) {
+        wrongByKind[kind] += count;
+    }
+    answers.insert(answers.end(), other.answers.begin(), other.answers.end());
+}
+
+std::size_t Tally::wrong() const {
+    return std::accumulate(wrongByKind.begin(), wrongByKind.end(), std::size_t{0},
+                           [](std::size_t sum, const auto& each) { return sum + each.second; });
+}
+
+std::vector<WrongAnswer> Tally::first() const {
+    std::vector<WrongAnswer> sorted = answers;
+    std::stable_sort(sorted.begin(), sorted.end(), [](const WrongAnswer& left, const WrongAnswer& right) {
+        return std::tuple(!left.client, left.number, left.client) <
+               std::tuple(!right.client, right.number, right.client);
+    });
+    sorted.resize(std::min(sorted.size(), shown));
+    return sorted;
+}
+
+double percentile(const std::vector<Tally::Time>& sorted, double share) {
+    if (sorted.empty()) {
+        return 0;
+    }
+    const double rank = std::ceil(share * static_cast<double>(sorted.size()));
+    const auto index = static_cast<std::size_t>(std::max(rank, 1.0)) - 1;
+    return std::chrono::duration<double, std::micro>(sorted[std::min(index, sorted.size() - 1)]).count();
+}
+
+Report reportOf(const Tally& tally, double seconds) {
+    Report report;
+    report.seconds = seconds;
+    std::vector<Tally::Time> all;
+    std::size_t wrong = 0;
+    for (std::size_t i = 0; i < deedCount; ++i) {
+        const auto deed = static_cast<Deed>(i);
+        const std::vector<Tally::Time>& times = tally.times(deed);
+        if (!times.empty()) {
+            report.deeds.push_back(figuresOf(nameOf(deed), times, tally.wrongOf(deed), seconds));
+        }
+        all.insert(all.end(), times.begin(), times.end());
+        wrong += tally.wrongOf(deed);
+    }
+    report.all = figuresOf("all", std::move(all), wrong, seconds);
+    report.wrong = tally.wrong();
+    report.kinds = tally.kinds();
+    report.first = tally.first();
+    return report;
+}
+
+}  // namespace cimhost::lab

@@ -1,0 +1,107 @@
+#include "lab/load/Checks.h"
+
+#include <gtest/gtest.h>
+
+#include "lab/test/Depot.h"
+
+namespace cimhost::load {
+namespace {
+
+std::string kindOf(const Verdict& verdict) {
+    return verdict ? verdict->kind : "right";
+}
+
+class ChecksTest : public testing::Test {
+protected:
+    ChecksTest() {
+        ledger.created("load-c1-1", {{"Text", testsupport::text("x")}});
+        ledger.created("load-c1-2", {});
+        ledger.doubt("load-c1-3");
+    }
+
+    Instance thing(const std::string& id, std::vector<cimhost::NamedValue> properties = {}) const {
+        return {known.instancePath(id), std::move(properties)};
+    }
+
+    /** What is wrong with an enumeration of what must be there and these. */
+    std::string listing(std::vector<Instance> more, bool hasProperties = false) const {
+        more.push_back(thing("old"));
+        more.push_back(thing("load-c1-1", {testsupport::named("Text", testsupport::text("x"))}));
+        more.push_back(thing("load-c1-2"));
+        return kindOf(checkListing(expectation, more, hasProperties));
+    }
+
+    LoadClass known = depotClass();
+    std::set<std::string> others{"old"};
+    Ledger ledger{};
+    Expectation expectation{known, others, ledger, "load-c1-", "load-"};
+};
+
+TEST_F(ChecksTest, AStatusIsTheOneThatMustBe) {
+    EXPECT_EQ(kindOf(checkStatus({}, CMPI_RC_OK)), "right");
+    EXPECT_EQ(kindOf(checkStatus({CMPI_RC_ERR_NOT_FOUND, ""}, CMPI_RC_ERR_NOT_FOUND)), "right");
+    const Verdict failure = checkStatus({CMPI_RC_ERR_FAILED, "broken"}, CMPI_RC_OK);
+    ASSERT_TRUE(failure);
+    EXPECT_EQ(failure->kind, "status");
+    EXPECT_EQ(failure->expected, "OK");
+    EXPECT_EQ(failure->got, "error 1 (CMPI_RC_ERR_FAILED): broken");
+    const Verdict success = checkStatus({}, CMPI_RC_ERR_ALREADY_EXISTS);
+    EXPECT_EQ(success->expected, "CMPI_RC_ERR_ALREADY_EXISTS");
+    EXPECT_EQ(success->got, "OK");
+}
+
+TEST_F(ChecksTest, ACreatedPathIsTheOneAskedFor) {
+    EXPECT_EQ(kindOf(checkPath(known.instancePath("a"), known.instancePath("a"))), "right");
+    EXPECT_EQ(kindOf(checkPath(known.instancePath("b"), known.instancePath("a"))), "path");
+    EXPECT_EQ(kindOf(checkPath(depotPath("Depot_Thing"), known.instancePath("a"))), "path");
+    EXPECT_EQ(kindOf(checkPath(depotClass("Depot_Liar").instancePath("a"), known.instancePath("a"))), "path");
+}
+
+TEST_F(ChecksTest, AnInstanceHasItsKeyAndTheValuesThatAreKnown) {
+    const Ledger::Values values{{"Text", testsupport::text("x")}};
+    const auto text = [](const char* value) { return testsupport::named("Text", testsupport::text(value)); };
+    EXPECT_EQ(kindOf(checkInstance(known, thing("a", {text("x")}), "a", values)), "right");
+    EXPECT_EQ(kindOf(checkInstance(known, thing("a", {text("y")}), "a", values)), "value");
+    EXPECT_EQ(kindOf(checkInstance(known, thing("a"), "a", values)), "value");
+    EXPECT_EQ(kindOf(checkInstance(known, thing("b", {text("x")}), "a", values)), "value");
+    EXPECT_EQ(kindOf(checkInstance(known, thing("a", {text("x")}), "a", {})), "right")
+        << "what is not known may be any";
+    EXPECT_EQ(kindOf(checkInstance(known, {depotPath("Depot_Thing"), {text("x")}}, "a", values)), "value") << "no key";
+}
+
+TEST_F(ChecksTest, AListingHasAllThatMustBeThere) {
+    EXPECT_EQ(listing({}), "right");
+    EXPECT_EQ(listing({}, true), "right");
+    EXPECT_EQ(kindOf(checkListing(expectation, {}, false)), "missing");
+    EXPECT_EQ(kindOf(checkListing(expectation, {thing("old"), thing("load-c1-1")}, false)), "missing");
+    EXPECT_EQ(kindOf(checkListing(expectation, {thing("load-c1-1"), thing("load-c1-2")}, false)), "missing");
+}
+
+TEST_F(ChecksTest, AListingHasNothingTwiceAndNothingElse) {
+    EXPECT_EQ(listing({thing("load-c1-1")}), "duplicate");
+    EXPECT_EQ(listing({thing("load-c1-4")}), "ghost");
+    EXPECT_EQ(listing({thing("load-c1-3")}), "right") << "nobody knows";
+    EXPECT_EQ(listing({thing("load-c2-1")}), "right") << "another client's";
+    EXPECT_EQ(listing({thing("odd")}), "stranger");
+    EXPECT_EQ(listing({thing("")}), "nameless");
+    EXPECT_EQ(listing({{depotPath("Depot_Thing"), {}}}), "nameless");
+}
+
+TEST_F(ChecksTest, AListingOfInstancesHasTheirValues) {
+    const std::vector<Instance> wrong{
+        thing("old"), thing("load-c1-1", {testsupport::named("Text", testsupport::text("y"))}), thing("load-c1-2")};
+    EXPECT_EQ(kindOf(checkListing(expectation, wrong, true)), "value");
+    EXPECT_EQ(kindOf(checkListing(expectation, wrong, false)), "right");
+}
+
+TEST_F(ChecksTest, AssociationsAreThoseOfBefore) {
+    EXPECT_EQ(kindOf(checkAssociated({"a", "b"}, {"a", "b"})), "right");
+    const Verdict verdict = checkAssociated({}, {"a", "b"});
+    ASSERT_TRUE(verdict);
+    EXPECT_EQ(verdict->kind, "association");
+    EXPECT_EQ(verdict->expected, "2: a...");
+    EXPECT_EQ(verdict->got, "nothing");
+}
+
+}  // namespace
+}  // namespace cimhost::load

@@ -1,0 +1,98 @@
+#include "lab/load/Plan.h"
+
+#include <gmock/gmock.h>
+
+#include "lab/test/Depot.h"
+
+namespace {
+
+using cimhost::lab::Deed;
+using cimhost::lab::LoadClass;
+using cimhost::lab::Mix;
+using cimhost::lab::Plan;
+using cimhost::lab::PlanError;
+using cimhost::lab::Random;
+using testing::HasSubstr;
+
+template <class Body>
+std::string errorOf(Body body) {
+    try {
+        body();
+        return {};
+    } catch (const PlanError& error) {
+        return error.what();
+    }
+}
+
+TEST(Mix, DoesWhatIsNamedAsOftenAsItSays) {
+    const Mix mix("create=1,get=3");
+    Random random(1, 1);
+    int gets = 0;
+    for (int i = 0; i < 4000; ++i) {
+        const Deed deed = mix.pick(random);
+        EXPECT_TRUE(deed == Deed::create || deed == Deed::get);
+        gets += deed == Deed::get ? 1 : 0;
+    }
+    EXPECT_NEAR(gets, 3000, 150);
+    EXPECT_EQ(mix.weight(Deed::remove), 0U);
+}
+
+TEST(Mix, UsuallyDoesEverythingButAssociations) {
+    const Mix mix;
+    for (const Deed deed : {Deed::create, Deed::modify, Deed::remove, Deed::enumerate, Deed::get}) {
+        EXPECT_GT(mix.weight(deed), 0U) << nameOf(deed);
+    }
+    EXPECT_EQ(mix.weight(Deed::associate), 0U);
+}
+
+TEST(Mix, RefusesWhatItCannotRead) {
+    EXPECT_THAT(errorOf([] { Mix("create=1,fly=2"); }), HasSubstr("fly is not one of create, modify"));
+    EXPECT_THAT(errorOf([] { Mix("create"); }), HasSubstr("'create' is no NAME=WEIGHT"));
+    EXPECT_THAT(errorOf([] { Mix("create=x"); }), HasSubstr("'x' is no weight"));
+    EXPECT_THAT(errorOf([] { Mix("create=-1"); }), HasSubstr("'-1' is no weight"));
+    EXPECT_THAT(errorOf([] { Mix("create="); }), HasSubstr("'' is no weight"));
+    EXPECT_THAT(errorOf([] { Mix("create=1000001"); }), HasSubstr("no weight"));
+    EXPECT_THAT(errorOf([] { Mix("create=0"); }), HasSubstr("nothing to do"));
+    EXPECT_THAT(errorOf([] { Mix(""); }), HasSubstr("nothing to do"));
+}
+
+TEST(LoadClass, TakesKeyAndModifiablePropertiesFromTheSchema) {
+    const LoadClass thing = depotClass("depot_thing");
+    EXPECT_EQ(thing.key, "Name");
+    std::vector<std::string> names;
+    for (const cimhost::Property* each : thing.modifiable) {
+        names.push_back(each->name);
+    }
+    EXPECT_THAT(names, testing::ElementsAre("Text", "Number", "Open"));
+    EXPECT_TRUE(depotClass("Depot_Sealed").modifiable.empty()) << "no values for arrays";
+}
+
+TEST(LoadClass, FindsIdentifiersInPathsAndInstances) {
+    const LoadClass thing = depotClass();
+    EXPECT_EQ(thing.idIn(thing.instancePath("x").keys), "x");
+    EXPECT_EQ(thing.idIn({}), std::nullopt);
+    EXPECT_EQ(thing.idIn({testsupport::named("NAME", testsupport::text("y"))}), "y");
+    EXPECT_EQ(thing.idIn({testsupport::named("Name", testsupport::uint32(1))}), std::nullopt);
+    EXPECT_EQ(thing.idIn({testsupport::named("Name", testsupport::nullOf(CMPI_string))}), std::nullopt);
+}
+
+TEST(LoadClass, RefusesClassesThatClientsCannotNameInstancesOf) {
+    EXPECT_THAT(errorOf([] { depotClass("Depot_Numbered"); }), HasSubstr("other keys than one string"));
+    EXPECT_THAT(errorOf([] { depotClass("Depot_Pair"); }), HasSubstr("other keys than one string"));
+    EXPECT_THAT(errorOf([] { depotClass("Depot_Missing"); }), HasSubstr("not in the schema"));
+}
+
+TEST(Plan, MustBeFeasible) {
+    Plan plan;
+    plan.classes = {depotClass()};
+    EXPECT_EQ(errorOf([&] { requireFeasible(plan); }), "");
+    plan.mix = Mix("associate=1");
+    EXPECT_THAT(errorOf([&] { requireFeasible(plan); }), HasSubstr("no instance whose associations"));
+    plan.mix = Mix();
+    plan.classes.push_back(depotClass("Depot_Sealed"));
+    EXPECT_THAT(errorOf([&] { requireFeasible(plan); }), HasSubstr("Depot_Sealed has no property"));
+    plan.mix = Mix("create=1,delete=1");
+    EXPECT_EQ(errorOf([&] { requireFeasible(plan); }), "");
+}
+
+}  // namespace
