@@ -112,7 +112,7 @@ bool lacksObject(const CMPIValue& value, CMPIType type) {
 
 Value arrayFrom(const CMPIArray* array, CMPIType type) {
     if (array == nullptr) {
-        return Value::nullArray(type);
+        return Value::null(type, true);
     }
     const ArrayContent& content = argument(array);
     if (content.type != type) {

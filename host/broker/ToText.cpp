@@ -16,7 +16,7 @@ std::string text(const std::vector<NamedValue>& values) {
 }
 
 std::string text(CMPIType type, const std::vector<Scalar>& elements) {
-    return formatMof(Value{type, true, false, elements});
+    return formatMof(Value::array(type, elements));
 }
 
 // One function a content.

@@ -58,7 +58,7 @@ public:
 
     void setNull(const std::string& name) {
         const Property& property = propertyOf(known, name);
-        add({property.name, property.isArray ? Value::nullArray(property.type) : Value::null(property.type)});
+        add({property.name, Value::null(property.type, property.isArray)});
     }
 
     std::vector<NamedValue> values{};

@@ -38,12 +38,8 @@ Value Value::array(CMPIType type, std::vector<Scalar> elements) {
     return {type, true, false, std::move(elements)};
 }
 
-Value Value::null(CMPIType type) {
-    return {type, false, true, {}};
-}
-
-Value Value::nullArray(CMPIType type) {
-    return {type, true, true, {}};
+Value Value::null(CMPIType type, bool isArray) {
+    return {type, isArray, true, {}};
 }
 
 Value Value::stringWithoutCharacters() {

@@ -49,8 +49,7 @@ struct Value {
     static Value of(CMPIType type, Scalar scalar);
     static Value array(CMPIType type, std::vector<Scalar> elements);
 
-    static Value null(CMPIType type);
-    static Value nullArray(CMPIType type);
+    static Value null(CMPIType type, bool isArray = false);
 
     /** @name Strings without characters
      * Some object managers pass string objects whose character pointer is null. The second is null as well: its data

@@ -143,13 +143,4 @@ CMPIType literalType(const Literal& literal) {
     return std::visit(LiteralKind{}, literal.value);
 }
 
-Value singleValue(CMPIType type, Scalar scalar) {
-    Value value{type};
-    if (!std::holds_alternative<std::monostate>(scalar)) {
-        value.isNull = false;
-        value.elements.push_back(std::move(scalar));
-    }
-    return value;
-}
-
 }  // namespace cimhost

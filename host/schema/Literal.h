@@ -30,7 +30,4 @@ Scalar typedScalar(const Literal& literal, CMPIType type);
 /** The type that a literal has where no class says it: string, boolean, uint64 or sint64, real64, char16. */
 CMPIType literalType(const Literal& literal);
 
-/** A value of one element; null for std::monostate. */
-Value singleValue(CMPIType type, Scalar scalar);
-
 }  // namespace cimhost

@@ -97,7 +97,7 @@ void complete(Instance& instance, const Class& declared, const Node& node) {
 }
 
 Value trueValue() {
-    return singleValue(CMPI_boolean, true);
+    return Value::of(CMPI_boolean, true);
 }
 
 }  // namespace
@@ -138,7 +138,7 @@ void MofBuilder::buildQualifierDeclaration(const Node& node) {
     declaration.name = findChild<mof::QualifierName>(node)->string();
     declaration.type = readType(*findChild<mof::DataType>(node));
     declaration.isArray = findChild<mof::ArrayMark>(node) != nullptr;
-    declaration.defaultValue = Value{declaration.type, declaration.isArray};
+    declaration.defaultValue = Value::null(declaration.type, declaration.isArray);
     if (const Node* value = findChild<mof::DefaultValue>(node)) {
         const Property type{declaration.name, declaration.type, declaration.isArray};
         declaration.defaultValue = readValue(*initializerOf(*value), type);
@@ -180,7 +180,7 @@ void MofBuilder::buildFeature(Class& declared, const Node& feature) const {
     }
     property.isArray = findChild<mof::ArrayMark>(feature) != nullptr;
     property.qualifiers = readQualifiers(findChild<mof::QualifierList>(feature));
-    property.defaultValue = Value{property.type, property.isArray};
+    property.defaultValue = Value::null(property.type, property.isArray);
     if (const Node* value = findChild<mof::DefaultValue>(feature)) {
         property.defaultValue = readValue(*initializerOf(*value), property);
     }
@@ -229,14 +229,14 @@ Value MofBuilder::readValue(const Node& initializer, const Property& type) const
         if (type.isArray && !isNull) {
             fail(initializer, type.name + " is an array: expected its values in braces");
         }
-        Value value = singleValue(type.type, scalar);
+        Value value = Value::of(type.type, scalar);
         value.isArray = type.isArray;
         return value;
     }
     if (!type.isArray) {
         fail(initializer, type.name + " is no array: expected one value without braces");
     }
-    Value value{type.type, true, false};
+    Value value = Value::array(type.type, {});
     for (const Node* constant : children<mof::Constant>(initializer)) {
         value.elements.push_back(readElement(*constant, type));
     }

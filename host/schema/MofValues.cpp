@@ -29,7 +29,7 @@ Value parseArray(std::string_view text, const Property& property, const Schema& 
     try {
         const auto root =
             peg::parse_tree::parse<mof::LoneArray, grammar::Node, mof::Selected, peg::nothing, mof::Control>(input);
-        Value value{property.type, true, false};
+        Value value = Value::array(property.type, {});
         for (const grammar::Node* constant : children<mof::Constant>(*root->children.front())) {
             value.elements.push_back(typedElement(constantLiteral(*constant), property, schema, defaultNameSpace));
         }

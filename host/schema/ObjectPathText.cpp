@@ -85,10 +85,10 @@ Value keyValue(const Literal& literal, const std::string& name, const Property* 
     }
     if (key == nullptr) {
         const CMPIType type = literalType(literal);
-        return singleValue(type, typedScalar(literal, type));
+        return Value::of(type, typedScalar(literal, type));
     }
     try {
-        return singleValue(key->type, typedElement(literal, *key, schema, defaultNameSpace));
+        return Value::of(key->type, typedElement(literal, *key, schema, defaultNameSpace));
     } catch (const std::runtime_error& error) {
         throw PathError("key " + name + ": " + error.what());
     }

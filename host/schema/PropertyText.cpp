@@ -46,7 +46,7 @@ Value parseText(std::string_view text, const Property& property, const Schema& s
     if (std::holds_alternative<std::monostate>(element)) {
         throw ValueError("null is no " + std::string(typeName(property.type)));
     }
-    return singleValue(property.type, element);
+    return Value::of(property.type, element);
 }
 
 }  // namespace

@@ -73,7 +73,8 @@ constexpr Row standard[] = {
 };
 
 QualifierDeclaration declaration(const Row& row) {
-    QualifierDeclaration declared{row.name, row.type, row.isArray, Value{row.type, row.isArray}, row.flavor, true};
+    QualifierDeclaration declared{row.name,   row.type, row.isArray, Value::null(row.type, row.isArray),
+                                  row.flavor, true};
     if (row.type == CMPI_boolean) {
         declared.defaultValue.isNull = false;
         declared.defaultValue.elements = {false};

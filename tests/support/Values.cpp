@@ -60,7 +60,7 @@ cimhost::Value reference(cimhost::ObjectPath path) {
 }
 
 cimhost::Value nullOf(CMPIType type) {
-    return {type, false, true, {}};
+    return cimhost::Value::null(type);
 }
 
 cimhost::NamedValue named(std::string name, cimhost::Value value) {

@@ -16,28 +16,28 @@ namespace {
 Instance instanceWith(const std::string& text) {
     Instance instance;
     instance.path.className = "C";
-    instance.properties.push_back({"A", singleValue(CMPI_string, text)});
+    instance.properties.push_back({"A", Value::of(CMPI_string, text)});
     return instance;
 }
 
 TEST(MofWriter, WritesEachKindOfValueAsAConstant) {
-    EXPECT_EQ(formatMof(singleValue(CMPI_boolean, true)), "TRUE");
-    EXPECT_EQ(formatMof(singleValue(CMPI_uint8, std::uint8_t{200})), "200");
-    EXPECT_EQ(formatMof(singleValue(CMPI_sint64, std::int64_t{INT64_MIN})), "-9223372036854775808");
-    EXPECT_EQ(formatMof(singleValue(CMPI_real64, 0.1)), "0.1");
-    EXPECT_EQ(formatMof(singleValue(CMPI_real64, 3.0)), "3.0");
-    EXPECT_EQ(formatMof(singleValue(CMPI_real64, 1e300)), "1.0e+300");
-    EXPECT_EQ(formatMof(singleValue(CMPI_char16, Char16{u'a'})), "'a'");
-    EXPECT_EQ(formatMof(singleValue(CMPI_char16, Char16{u'\''})), R"('\x0027')");
-    EXPECT_EQ(formatMof(singleValue(CMPI_string, std::string("a\"b\\c\n\x01"))), R"("a\"b\\c\n\x0001")");
-    EXPECT_EQ(formatMof(singleValue(CMPI_string, std::monostate{})), "NULL");
+    EXPECT_EQ(formatMof(Value::of(CMPI_boolean, true)), "TRUE");
+    EXPECT_EQ(formatMof(Value::of(CMPI_uint8, std::uint8_t{200})), "200");
+    EXPECT_EQ(formatMof(Value::of(CMPI_sint64, std::int64_t{INT64_MIN})), "-9223372036854775808");
+    EXPECT_EQ(formatMof(Value::of(CMPI_real64, 0.1)), "0.1");
+    EXPECT_EQ(formatMof(Value::of(CMPI_real64, 3.0)), "3.0");
+    EXPECT_EQ(formatMof(Value::of(CMPI_real64, 1e300)), "1.0e+300");
+    EXPECT_EQ(formatMof(Value::of(CMPI_char16, Char16{u'a'})), "'a'");
+    EXPECT_EQ(formatMof(Value::of(CMPI_char16, Char16{u'\''})), R"('\x0027')");
+    EXPECT_EQ(formatMof(Value::of(CMPI_string, std::string("a\"b\\c\n\x01"))), R"("a\"b\\c\n\x0001")");
+    EXPECT_EQ(formatMof(Value::of(CMPI_string, std::monostate{})), "NULL");
     EXPECT_EQ(formatMof(Value{CMPI_string, true, false}), "{}");
 }
 
 TEST(MofWriter, WhatMofHasNoWordForIsNull) {
-    EXPECT_EQ(formatMof(singleValue(CMPI_real64, std::numeric_limits<double>::infinity())), "NULL");
-    EXPECT_EQ(formatMof(singleValue(CMPI_real32, std::nanf(""))), "NULL");
-    EXPECT_EQ(formatMof(singleValue(CMPI_ref, std::shared_ptr<const ObjectPath>())), "NULL");
+    EXPECT_EQ(formatMof(Value::of(CMPI_real64, std::numeric_limits<double>::infinity())), "NULL");
+    EXPECT_EQ(formatMof(Value::of(CMPI_real32, std::nanf(""))), "NULL");
+    EXPECT_EQ(formatMof(Value::of(CMPI_ref, std::shared_ptr<const ObjectPath>())), "NULL");
 }
 
 TEST(MofWriter, AnInstanceIsWrittenInUtf8WhateverItsTextsAre) {
@@ -90,7 +90,7 @@ TEST(MofWriter, AControlCharacterBeforeAHexadecimalDigitIsReadBack) {
         "\x01"
         "2\x7F"
         "f";
-    const std::string written = formatMof(singleValue(CMPI_string, text));
+    const std::string written = formatMof(Value::of(CMPI_string, text));
     const Schema schema = schemaOf("class C { string A = " + written + "; };");
     EXPECT_EQ(formatMof(schema.findClass("C")->properties.front().defaultValue), written);
 }
@@ -110,8 +110,8 @@ TEST(MofWriter, TheLargestRealNumbersAreReadBack) {
 
 TEST(MofWriter, EmbedsAnInstanceAsAString) {
     const auto inner = std::make_shared<const Instance>(
-        Instance{{"", "", "Inner", {}}, {{"Text", singleValue(CMPI_string, std::string("x"))}}});
-    EXPECT_EQ(formatMof(singleValue(CMPI_instance, inner)), R"("instance of Inner {\n    Text = \"x\";\n};\n")");
+        Instance{{"", "", "Inner", {}}, {{"Text", Value::of(CMPI_string, std::string("x"))}}});
+    EXPECT_EQ(formatMof(Value::of(CMPI_instance, inner)), R"("instance of Inner {\n    Text = \"x\";\n};\n")");
 }
 
 constexpr auto everything = R"(
@@ -158,7 +158,7 @@ TEST(MofWriter, WritesWhatTheReaderReadsForEveryType) {
 
 TEST(MofWriter, RealsReadBackAsTheSameNumber) {
     for (const double real : {0.1, 1.0 / 3, 5e-324, 1.7976931348623157e308, 123456789.125, -0.0}) {
-        const Schema schema = schemaOf("class C { real64 X = " + formatMof(singleValue(CMPI_real64, real)) + "; };");
+        const Schema schema = schemaOf("class C { real64 X = " + formatMof(Value::of(CMPI_real64, real)) + "; };");
         EXPECT_EQ(element<double>(schema.findClass("C")->properties[0].defaultValue), real);
     }
 }

@@ -39,9 +39,9 @@ TEST(ObjectPath, HasNamespaceClassAndTypedKeys) {
     EXPECT_EQ(path.nameSpace, "root/other");
     EXPECT_EQ(path.className, "Slot");
     ASSERT_EQ(path.keys.size(), 3U);
-    EXPECT_EQ(described(path.keys[0].value), described(singleValue(CMPI_uint32, std::uint32_t{5})));
-    EXPECT_EQ(described(path.keys[1].value), described(singleValue(CMPI_boolean, true)));
-    EXPECT_EQ(described(path.keys[2].value), described(singleValue(CMPI_sint8, std::int8_t{-3})));
+    EXPECT_EQ(described(path.keys[0].value), described(Value::of(CMPI_uint32, std::uint32_t{5})));
+    EXPECT_EQ(described(path.keys[1].value), described(Value::of(CMPI_boolean, true)));
+    EXPECT_EQ(described(path.keys[2].value), described(Value::of(CMPI_sint8, std::int8_t{-3})));
 }
 
 TEST(ObjectPath, WithoutNamespaceTakesTheDefaultOne) {
@@ -122,7 +122,7 @@ TEST(ObjectPath, AStringOfEveryByteSurvivesWritingAndReading) {
     for (int byte = 1; byte < 256; ++byte) {
         all += static_cast<char>(byte);
     }
-    const ObjectPath path{"", "n", "Disk", {{"ID", singleValue(CMPI_string, all)}}};
+    const ObjectPath path{"", "n", "Disk", {{"ID", Value::of(CMPI_string, all)}}};
     EXPECT_EQ(element<std::string>(parse(formatObjectPath(path)).keys[0].value), all);
 }
 

@@ -42,10 +42,8 @@ void trim(std::vector<NamedValue>& values, const std::function<bool(char)>& isRe
 
 /** The value of a property that the client did not set. */
 Value unsetValue(const PropertyInfo& property, const Value& unsetString) {
-    if (property.isArray) {
-        return Value::nullArray(property.type);
-    }
-    return property.type == CMPI_string ? unsetString : Value::null(property.type);
+    const bool isSingleString = property.type == CMPI_string && !property.isArray;
+    return isSingleString ? unsetString : Value::null(property.type, property.isArray);
 }
 
 /** All properties of the class in its order, then those that it does not have. */

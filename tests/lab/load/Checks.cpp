@@ -28,18 +28,18 @@ std::optional<std::string> idOf(const LoadClass& known, const Instance& instance
 
 /** One of many: at most one is wrong in it. */
 Verdict checkListed(const Expectation& expectation, const std::string& id, const Instance* instance) {
-    const auto& known = expectation.ledger.instances();
+    const auto& known = expectation.state.instances();
     const auto found = known.find(id);
     if (found != known.end()) {
         return instance == nullptr ? std::nullopt : checkInstance(expectation.known, *instance, id, found->second);
     }
     if (beginsWith(id, expectation.own)) {
-        return expectation.ledger.isDoubtful(id)
+        return expectation.state.isDoubtful(id)
                    ? std::nullopt
-                   : Verdict(Wrong{"ghost", "no instance " + id, "one that is not deleted"});
+                   : Verdict(Mismatch{"deleted", "no instance " + id, "one that is not deleted"});
     }
     const bool isAllowed = beginsWith(id, expectation.any) || expectation.others.count(id) != 0;
-    return isAllowed ? std::nullopt : Verdict(Wrong{"stranger", "only instances that somebody made", inQuotes(id)});
+    return isAllowed ? std::nullopt : Verdict(Mismatch{"unknown", "only instances that somebody made", inQuotes(id)});
 }
 
 template <class Ids, class IdOf>
@@ -47,8 +47,8 @@ Verdict checkNoneMissing(const Ids& ids, const std::set<std::string>& listed, Id
     const auto missing =
         std::find_if(ids.begin(), ids.end(), [&](const auto& each) { return listed.count(idOf(each)) == 0; });
     return missing == ids.end() ? std::nullopt
-                                : Verdict(Wrong{"missing", "instance " + idOf(*missing),
-                                                "only " + std::to_string(listed.size()) + " others"});
+                                : Verdict(Mismatch{"missing", "instance " + idOf(*missing),
+                                                   "only " + std::to_string(listed.size()) + " others"});
 }
 
 }  // namespace
@@ -57,7 +57,7 @@ Verdict checkStatus(const Status& status, int code) {
     if (status.rc == code) {
         return std::nullopt;
     }
-    return Wrong{"status", code == CMPI_RC_OK ? "OK" : codeName(code), textOf(status)};
+    return Mismatch{"status", code == CMPI_RC_OK ? "OK" : codeName(code), textOf(status)};
 }
 
 Verdict checkPath(const ObjectPath& created, const ObjectPath& expected) {
@@ -67,21 +67,21 @@ Verdict checkPath(const ObjectPath& created, const ObjectPath& expected) {
     if (isSame) {
         return std::nullopt;
     }
-    return Wrong{"path", formatObjectPath(expected), formatObjectPath(created)};
+    return Mismatch{"path", formatObjectPath(expected), formatObjectPath(created)};
 }
 
 Verdict checkInstance(const LoadClass& known, const Instance& instance, const std::string& id,
-                      const Ledger::Values& values) {
+                      const ExpectedState::Values& values) {
     const std::optional<std::string> inPath = known.idIn(instance.path.keys);
     const std::optional<std::string> inProperties = known.idIn(instance.properties);
     if (inPath.value_or(id) != id || inProperties.value_or(id) != id || (!inPath && !inProperties)) {
-        return Wrong{"value", known.key + " = " + inQuotes(id), formatObjectPath(instance.path)};
+        return Mismatch{"value", known.key + " = " + inQuotes(id), formatObjectPath(instance.path)};
     }
     for (const auto& [name, value] : values) {
         const NamedValue* found = findNamed(instance.properties, name);
         if (found == nullptr || !sameValue(found->value, value)) {
-            return Wrong{"value", name + " = " + formatMof(value),
-                         found == nullptr ? "none" : name + " = " + formatMof(found->value)};
+            return Mismatch{"value", name + " = " + formatMof(value),
+                            found == nullptr ? "none" : name + " = " + formatMof(found->value)};
         }
     }
     return std::nullopt;
@@ -92,10 +92,10 @@ Verdict checkListing(const Expectation& expectation, const std::vector<Instance>
     for (const Instance& instance : instances) {
         const std::optional<std::string> id = idOf(expectation.known, instance);
         if (!id || id->empty()) {
-            return Wrong{"nameless", "instances with a key", formatObjectPath(instance.path)};
+            return Mismatch{"nameless", "instances with a key", formatObjectPath(instance.path)};
         }
         if (!listed.insert(*id).second) {
-            return Wrong{"duplicate", "instance " + *id + " once", "more than once"};
+            return Mismatch{"duplicate", "instance " + *id + " once", "more than once"};
         }
         Verdict verdict = checkListed(expectation, *id, hasProperties ? &instance : nullptr);
         if (verdict) {
@@ -103,7 +103,7 @@ Verdict checkListing(const Expectation& expectation, const std::vector<Instance>
         }
     }
     Verdict verdict = checkNoneMissing(expectation.others, listed, [](const std::string& id) { return id; });
-    return verdict ? verdict : checkNoneMissing(expectation.ledger.instances(), listed, [](const auto& instance) {
+    return verdict ? verdict : checkNoneMissing(expectation.state.instances(), listed, [](const auto& instance) {
         return instance.first;
     });
 }
@@ -113,7 +113,7 @@ Verdict checkAssociated(const std::vector<std::string>& now, const std::vector<s
         return paths.empty() ? "nothing"
                              : std::to_string(paths.size()) + ": " + paths.front() + (paths.size() > 1 ? "..." : "");
     };
-    return now == before ? std::nullopt : Verdict(Wrong{"association", listed(before), listed(now)});
+    return now == before ? std::nullopt : Verdict(Mismatch{"association", listed(before), listed(now)});
 }
 
 }  // namespace cimhost::lab

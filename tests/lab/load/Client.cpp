@@ -7,8 +7,8 @@
 namespace cimhost::lab {
 namespace {
 
-Ledger::Values byName(const std::vector<NamedValue>& values) {
-    Ledger::Values map;
+ExpectedState::Values byName(const std::vector<NamedValue>& values) {
+    ExpectedState::Values map;
     for (const NamedValue& each : values) {
         map[each.name] = each.value;
     }
@@ -16,8 +16,8 @@ Ledger::Values byName(const std::vector<NamedValue>& values) {
 }
 
 /** Whether it is done to an instance that is there. */
-bool needsInstance(Deed deed) {
-    return deed == Deed::modify || deed == Deed::remove || deed == Deed::get;
+bool needsInstance(OperationKind kind) {
+    return kind == OperationKind::modify || kind == OperationKind::remove || kind == OperationKind::get;
 }
 
 }  // namespace
@@ -40,28 +40,28 @@ void Client::run(std::size_t requests) {
 
 void Client::take() {
     turn = {random.below(plan.classes.size()), plan.mix.pick(random), {}, {}};
-    if (needsInstance(turn.deed) && ledger().isEmpty() && !plan.probes) {
-        turn.deed = Deed::create;
+    if (needsInstance(turn.kind) && state().isEmpty() && !plan.probes) {
+        turn.kind = OperationKind::create;
     }
     ++asked;
     Verdict verdict = act();
-    found.count(turn.deed, turn.time, verdict.has_value());
+    found.count(turn.kind, turn.time, verdict.has_value());
     if (verdict) {
         found.note({number, asked, turn.request, std::move(*verdict)});
     }
 }
 
 Verdict Client::act() {
-    switch (turn.deed) {
-        case Deed::create:
+    switch (turn.kind) {
+        case OperationKind::create:
             return create();
-        case Deed::modify:
+        case OperationKind::modify:
             return modify();
-        case Deed::remove:
+        case OperationKind::remove:
             return remove();
-        case Deed::enumerate:
+        case OperationKind::enumerate:
             return enumerate();
-        case Deed::associate:
+        case OperationKind::associate:
             return associate();
         default:
             return get();
@@ -78,11 +78,11 @@ Response Client::ask(const Request& request) {
 
 Verdict Client::judge(const Response& response, int code) {
     const std::string reason = response.crashReason();
-    return reason.empty() ? checkStatus(response.status, code) : Verdict(Wrong{"died", "an answer", reason});
+    return reason.empty() ? checkStatus(response.status, code) : Verdict(Mismatch{"died", "an answer", reason});
 }
 
 Verdict Client::create() {
-    if (!ledger().isEmpty() && plan.probes && random.oneIn(16)) {
+    if (!state().isEmpty() && plan.probes && random.oneIn(16)) {
         return createAgain();
     }
     const std::string id = newId();
@@ -94,18 +94,18 @@ Verdict Client::create() {
         verdict = checkPath(response.paths.front(), request.path);
     }
     if (verdict) {
-        ledger().doubt(id);
+        state().doubt(id);
     } else {
-        ledger().created(id, byName(values));
+        state().created(id, byName(values));
     }
     return verdict;
 }
 
 Verdict Client::createAgain() {
-    const std::string id = ledger().any(random);
+    const std::string id = state().any(random);
     Verdict verdict = judge(ask(createRequest(aClass(), id, {})), CMPI_RC_ERR_ALREADY_EXISTS);
     if (verdict) {
-        ledger().doubt(id);
+        state().doubt(id);
     }
     return verdict;
 }
@@ -116,31 +116,31 @@ Verdict Client::askForMissing(const Request& request) {
 
 Verdict Client::modify() {
     return probes() ? askForMissing(modifyRequest(aClass(), missingId(), someValues(), plan.listsChanges))
-                    : modifyOwn(ledger().any(random));
+                    : modifyOwn(state().any(random));
 }
 
 Verdict Client::modifyOwn(const std::string& id) {
     const std::vector<NamedValue> values = someValues();
     Verdict verdict = judge(ask(modifyRequest(aClass(), id, values, plan.listsChanges)), CMPI_RC_OK);
     if (verdict) {
-        ledger().doubt(id);
+        state().doubt(id);
     } else {
-        ledger().modified(id, byName(values));
+        state().modified(id, byName(values));
     }
     return verdict;
 }
 
 Verdict Client::remove() {
     return probes() ? askForMissing(Request::deleteInstance(aClass().instancePath(missingId())))
-                    : removeOwn(ledger().any(random));
+                    : removeOwn(state().any(random));
 }
 
 Verdict Client::removeOwn(const std::string& id) {
     Verdict verdict = judge(ask(Request::deleteInstance(aClass().instancePath(id))), CMPI_RC_OK);
     if (verdict) {
-        ledger().doubt(id);
+        state().doubt(id);
     } else {
-        ledger().removed(id);
+        state().removed(id);
         lastRemoved = id;
     }
     return verdict;
@@ -150,10 +150,10 @@ Verdict Client::get() {
     if (probes()) {
         return askForMissing(Request::getInstance(aClass().instancePath(missingId())));
     }
-    const std::string id = ledger().any(random);
+    const std::string id = state().any(random);
     const Response response = ask(Request::getInstance(aClass().instancePath(id)));
     Verdict verdict = judge(response, CMPI_RC_OK);
-    return verdict ? verdict : checkInstance(aClass(), response.instances.front(), id, ledger().instances().at(id));
+    return verdict ? verdict : checkInstance(aClass(), response.instances.front(), id, state().instances().at(id));
 }
 
 Verdict Client::enumerate() {
@@ -162,7 +162,7 @@ Verdict Client::enumerate() {
     const Response response =
         ask(hasProperties ? Request::enumerateInstances(path) : Request::enumerateInstanceNames(path));
     Verdict verdict = judge(response, CMPI_RC_OK);
-    const Expectation expectation{aClass(), baseline.ids[turn.index], ledger(), prefix, baseline.prefix};
+    const Expectation expectation{aClass(), baseline.ids[turn.index], state(), prefix, baseline.prefix};
     return verdict ? verdict : checkListing(expectation, listed(response), hasProperties);
 }
 

@@ -3,7 +3,7 @@
 #include <vector>
 
 #include "lab/load/Baseline.h"
-#include "lab/load/Ledger.h"
+#include "lab/load/ExpectedState.h"
 #include "lab/load/Report.h"
 
 namespace cimhost::lab {
@@ -20,18 +20,18 @@ public:
 
     void run(std::size_t requests);
 
-    const Tally& tally() const { return found; }
+    const Statistics& statistics() const { return found; }
 
     /** What it was told, by class of the plan. */
-    const std::vector<Ledger>& ledgers() const { return known; }
+    const std::vector<ExpectedState>& states() const { return known; }
 
 private:
     /** The request being made: which class it is about, what it turned out to be. */
     struct Turn {
         std::size_t index = 0;  ///< of the class
-        Deed deed = Deed::get;
+        OperationKind kind = OperationKind::get;
         std::string request{};
-        Tally::Time time{};
+        Statistics::Time time{};
     };
 
     void take();
@@ -53,10 +53,10 @@ private:
     static Verdict judge(const Response& response, int code);
 
     const LoadClass& aClass() const { return plan.classes[turn.index]; }
-    Ledger& ledger() { return known[turn.index]; }
+    ExpectedState& state() { return known[turn.index]; }
     std::string newId();
     std::string missingId();  ///< what it deleted last, or never makes; good for every class
-    bool probes() { return ledger().isEmpty() || (plan.probes && random.oneIn(16)); }
+    bool probes() { return state().isEmpty() || (plan.probes && random.oneIn(16)); }
     std::vector<NamedValue> someValues();
 
     ObjectManager& manager;
@@ -65,8 +65,8 @@ private:
     unsigned number;
     std::string prefix;  ///< of its identifiers
     Random random;
-    Tally found;
-    std::vector<Ledger> known;
+    Statistics found;
+    std::vector<ExpectedState> known;
     std::size_t made = 0;  ///< identifiers, in all classes together
     std::string lastRemoved{};
     std::size_t asked = 0;  ///< requests

@@ -42,10 +42,10 @@ double runClients(const Clients& clients, std::size_t requests) {
 }
 
 /** What all clients together were told of a class. */
-Ledger ledgerOf(const Clients& clients, std::size_t index) {
-    Ledger all;
+ExpectedState stateOf(const Clients& clients, std::size_t index) {
+    ExpectedState all;
     for (const auto& client : clients) {
-        all.add(client->ledgers()[index]);
+        all.add(client->states()[index]);
     }
     return all;
 }
@@ -53,29 +53,29 @@ Ledger ledgerOf(const Clients& clients, std::size_t index) {
 /** Looks at the end, alone, at what is there. */
 class Inspection {
 public:
-    Inspection(ObjectManager& itsManager, const Baseline& itsBaseline, Tally& itsTally)
-        : manager(itsManager), baseline(itsBaseline), tally(itsTally) {}
+    Inspection(ObjectManager& itsManager, const Baseline& itsBaseline, Statistics& itsStatistics)
+        : manager(itsManager), baseline(itsBaseline), statistics(itsStatistics) {}
 
-    /** Whether a class holds what the ledger says. */
-    void inspect(const LoadClass& known, const std::set<std::string>& others, const Ledger& ledger) {
+    /** Whether a class holds what the state says. */
+    void inspect(const LoadClass& known, const std::set<std::string>& others, const ExpectedState& state) {
         const Request request = Request::enumerateInstances(known.path);
         const Response response = manager.perform(request);
         Verdict verdict = checkStatus(response.status, CMPI_RC_OK);
         if (!verdict) {
-            verdict = checkListing({known, others, ledger, baseline.prefix, baseline.prefix}, response.instances, true);
+            verdict = checkListing({known, others, state, baseline.prefix, baseline.prefix}, response.instances, true);
         }
         note(request, std::move(verdict));
     }
 
-    /** Deletes what the ledger has, and what it may have. */
-    void clear(const LoadClass& known, Ledger& ledger) {
-        const std::map<std::string, Ledger::Values> instances = ledger.instances();
+    /** Deletes what the state has, and what it may have. */
+    void clear(const LoadClass& known, ExpectedState& state) {
+        const std::map<std::string, ExpectedState::Values> instances = state.instances();
         for (const auto& [id, values] : instances) {
             const Request request = Request::deleteInstance(known.instancePath(id));
             note(request, checkStatus(manager.perform(request).status, CMPI_RC_OK));
-            ledger.removed(id);
+            state.removed(id);
         }
-        for (const std::string& id : ledger.doubted()) {
+        for (const std::string& id : state.doubted()) {
             manager.perform(Request::deleteInstance(known.instancePath(id)));
         }
     }
@@ -85,25 +85,25 @@ private:
         ++number;
         if (verdict) {
             const std::string text = std::string(nameOf(request.operation)) + " " + formatObjectPath(request.path);
-            tally.note({std::nullopt, number, text, std::move(*verdict)});
+            statistics.note({std::nullopt, number, text, std::move(*verdict)});
         }
     }
 
     ObjectManager& manager;
     const Baseline& baseline;
-    Tally& tally;
+    Statistics& statistics;
     std::size_t number = 0;
 };
 
 void inspectAll(ObjectManager& manager, const Plan& plan, const Baseline& baseline, const Clients& clients,
-                Tally& tally) {
-    Inspection inspection(manager, baseline, tally);
+                Statistics& statistics) {
+    Inspection inspection(manager, baseline, statistics);
     for (std::size_t i = 0; i < plan.classes.size(); ++i) {
-        Ledger ledger = ledgerOf(clients, i);
-        inspection.inspect(plan.classes[i], baseline.ids[i], ledger);
+        ExpectedState state = stateOf(clients, i);
+        inspection.inspect(plan.classes[i], baseline.ids[i], state);
         if (!plan.keeps) {
-            inspection.clear(plan.classes[i], ledger);
-            inspection.inspect(plan.classes[i], baseline.ids[i], ledger);
+            inspection.clear(plan.classes[i], state);
+            inspection.inspect(plan.classes[i], baseline.ids[i], state);
         }
     }
 }
@@ -111,11 +111,11 @@ void inspectAll(ObjectManager& manager, const Plan& plan, const Baseline& baseli
 }  // namespace
 
 void requireFeasible(const Plan& plan) {
-    if (plan.mix.weight(Deed::associate) > 0 && !plan.source) {
+    if (plan.mix.weight(OperationKind::associate) > 0 && !plan.source) {
         throw PlanError("there are associations in the mix, but no instance whose associations to ask for");
     }
     for (const LoadClass& each : plan.classes) {
-        if (plan.mix.weight(Deed::modify) > 0 && each.modifiable.empty()) {
+        if (plan.mix.weight(OperationKind::modify) > 0 && each.modifiable.empty()) {
             throw PlanError("class " + each.path.className + " has no property with the qualifier Write that a load " +
                             "has values for; leave modify out of the mix");
         }
@@ -130,12 +130,12 @@ Answer<Report> runLoad(ObjectManager& manager, const Plan& plan) {
     }
     const Clients clients = makeClients(manager, plan, baseline.value);
     const double seconds = runClients(clients, plan.requests);
-    Tally tally(plan.shown);
+    Statistics statistics(plan.shown);
     for (const auto& client : clients) {
-        tally.add(client->tally());
+        statistics.add(client->statistics());
     }
-    inspectAll(manager, plan, baseline.value, clients, tally);
-    Report report = reportOf(tally, seconds);
+    inspectAll(manager, plan, baseline.value, clients, statistics);
+    Report report = reportOf(statistics, seconds);
     report.clients = plan.clients;
     report.seed = plan.seed;
     return {{}, std::move(report)};

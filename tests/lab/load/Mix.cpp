@@ -9,10 +9,11 @@
 namespace cimhost::lab {
 namespace {
 
-constexpr std::array<const char*, deedCount> names{"create", "modify", "delete", "enumerate", "get", "associate"};
-constexpr std::array<unsigned, deedCount> usualWeights{20, 25, 15, 5, 35, 0};
+constexpr std::array<const char*, operationKindCount> names{"create",    "modify", "delete",
+                                                            "enumerate", "get",    "associate"};
+constexpr std::array<unsigned, operationKindCount> usualWeights{20, 25, 15, 5, 35, 0};
 
-std::size_t deedNamed(const std::string& name) {
+std::size_t kindNamed(const std::string& name) {
     const auto* const found = std::find(names.begin(), names.end(), name);
     if (found == names.end()) {
         throw PlanError(name + " is not one of create, modify, delete, enumerate, get and associate");
@@ -32,8 +33,8 @@ unsigned weightFrom(const std::string& text) {
 
 }  // namespace
 
-const char* nameOf(Deed deed) {
-    return names[static_cast<std::size_t>(deed)];
+const char* nameOf(OperationKind kind) {
+    return names[static_cast<std::size_t>(kind)];
 }
 
 Mix::Mix() : weights(usualWeights) {}
@@ -45,20 +46,20 @@ Mix::Mix(const std::string& text) {
         if (equals == std::string::npos) {
             throw PlanError("'" + part + "' is no NAME=WEIGHT, such as create=2");
         }
-        weights[deedNamed(part.substr(0, equals))] = weightFrom(part.substr(equals + 1));
+        weights[kindNamed(part.substr(0, equals))] = weightFrom(part.substr(equals + 1));
     }
     if (std::all_of(weights.begin(), weights.end(), [](unsigned each) { return each == 0; })) {
         throw PlanError("there is nothing to do in the mix '" + text + "'");
     }
 }
 
-Deed Mix::pick(Random& random) const {
+OperationKind Mix::pick(Random& random) const {
     std::uint64_t left = random.below(std::accumulate(weights.begin(), weights.end(), std::uint64_t{0}));
-    std::size_t deed = 0;
-    while (left >= weights[deed]) {
-        left -= weights[deed++];
+    std::size_t kind = 0;
+    while (left >= weights[kind]) {
+        left -= weights[kind++];
     }
-    return static_cast<Deed>(deed);
+    return static_cast<OperationKind>(kind);
 }
 
 }  // namespace cimhost::lab

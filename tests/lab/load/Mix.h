@@ -15,12 +15,12 @@ public:
 };
 
 /** What clients do. */
-enum class Deed { create, modify, remove, enumerate, get, associate };
+enum class OperationKind { create, modify, remove, enumerate, get, associate };
 
-constexpr std::size_t deedCount = 6;
+constexpr std::size_t operationKindCount = 6;
 
 /** "create", "modify", "delete" and so on. */
-const char* nameOf(Deed deed);
+const char* nameOf(OperationKind kind);
 
 /** How often clients do what, as weights. */
 class Mix {
@@ -31,11 +31,11 @@ public:
     /** Reads "create=2,get=5": what is not named is not done. PlanError when the text is none or nothing is left. */
     explicit Mix(const std::string& text);
 
-    unsigned weight(Deed deed) const { return weights[static_cast<std::size_t>(deed)]; }
-    Deed pick(Random& random) const;
+    unsigned weight(OperationKind kind) const { return weights[static_cast<std::size_t>(kind)]; }
+    OperationKind pick(Random& random) const;
 
 private:
-    std::array<unsigned, deedCount> weights{};
+    std::array<unsigned, operationKindCount> weights{};
 };
 
 }  // namespace cimhost::lab

@@ -8,7 +8,7 @@
 namespace cimhost::lab {
 namespace {
 
-Figures figuresOf(std::string name, std::vector<Tally::Time> times, std::size_t wrong, double seconds) {
+Figures figuresOf(std::string name, std::vector<Statistics::Time> times, std::size_t wrong, double seconds) {
     std::sort(times.begin(), times.end());
     return {std::move(name),
             times.size(),
@@ -22,23 +22,24 @@ Figures figuresOf(std::string name, std::vector<Tally::Time> times, std::size_t 
 
 }  // namespace
 
-void Tally::count(Deed deed, Time time, bool isWrong) {
-    OfDeed& target = deeds[static_cast<std::size_t>(deed)];
+void Statistics::count(OperationKind kind, Time time, bool isWrong) {
+    OfKind& target = operations[static_cast<std::size_t>(kind)];
     target.times.push_back(time);
     target.wrong += isWrong ? 1 : 0;
 }
 
-void Tally::note(WrongAnswer answer) {
+void Statistics::note(WrongAnswer answer) {
     ++wrongByKind[answer.wrong.kind];
     if (answers.size() < shown) {
         answers.push_back(std::move(answer));
     }
 }
 
-void Tally::add(const Tally& other) {
-    for (std::size_t i = 0; i < deedCount; ++i) {
-        deeds[i].times.insert(deeds[i].times.end(), other.deeds[i].times.begin(), other.deeds[i].times.end());
-        deeds[i].wrong += other.deeds[i].wrong;
+void Statistics::add(const Statistics& other) {
+    for (std::size_t i = 0; i < operationKindCount; ++i) {
+        operations[i].times.insert(operations[i].times.end(), other.operations[i].times.begin(),
+                                   other.operations[i].times.end());
+        operations[i].wrong += other.operations[i].wrong;
     }
     for (const auto& [kind, count] : other.wrongByKind) {
         wrongByKind[kind] += count;
@@ -46,12 +47,12 @@ void Tally::add(const Tally& other) {
     answers.insert(answers.end(), other.answers.begin(), other.answers.end());
 }
 
-std::size_t Tally::wrong() const {
+std::size_t Statistics::wrong() const {
     return std::accumulate(wrongByKind.begin(), wrongByKind.end(), std::size_t{0},
                            [](std::size_t sum, const auto& each) { return sum + each.second; });
 }
 
-std::vector<WrongAnswer> Tally::first() const {
+std::vector<WrongAnswer> Statistics::first() const {
     std::vector<WrongAnswer> sorted = answers;
     std::stable_sort(sorted.begin(), sorted.end(), [](const WrongAnswer& left, const WrongAnswer& right) {
         return std::tuple(!left.client, left.number, left.client) <
@@ -61,7 +62,7 @@ std::vector<WrongAnswer> Tally::first() const {
     return sorted;
 }
 
-double percentile(const std::vector<Tally::Time>& sorted, double share) {
+double percentile(const std::vector<Statistics::Time>& sorted, double share) {
     if (sorted.empty()) {
         return 0;
     }
@@ -70,24 +71,24 @@ double percentile(const std::vector<Tally::Time>& sorted, double share) {
     return std::chrono::duration<double, std::micro>(sorted[std::min(index, sorted.size() - 1)]).count();
 }
 
-Report reportOf(const Tally& tally, double seconds) {
+Report reportOf(const Statistics& statistics, double seconds) {
     Report report;
     report.seconds = seconds;
-    std::vector<Tally::Time> all;
+    std::vector<Statistics::Time> all;
     std::size_t wrong = 0;
-    for (std::size_t i = 0; i < deedCount; ++i) {
-        const auto deed = static_cast<Deed>(i);
-        const std::vector<Tally::Time>& times = tally.times(deed);
+    for (std::size_t i = 0; i < operationKindCount; ++i) {
+        const auto kind = static_cast<OperationKind>(i);
+        const std::vector<Statistics::Time>& times = statistics.times(kind);
         if (!times.empty()) {
-            report.deeds.push_back(figuresOf(nameOf(deed), times, tally.wrongOf(deed), seconds));
+            report.operations.push_back(figuresOf(nameOf(kind), times, statistics.wrongOf(kind), seconds));
         }
         all.insert(all.end(), times.begin(), times.end());
-        wrong += tally.wrongOf(deed);
+        wrong += statistics.wrongOf(kind);
     }
     report.all = figuresOf("all", std::move(all), wrong, seconds);
-    report.wrong = tally.wrong();
-    report.kinds = tally.kinds();
-    report.first = tally.first();
+    report.wrong = statistics.wrong();
+    report.kinds = statistics.kinds();
+    report.first = statistics.first();
     return report;
 }
 

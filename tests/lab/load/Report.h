@@ -18,23 +18,23 @@ struct WrongAnswer {
     std::optional<unsigned> client{};  ///< from 1; none for what was asked at the end
     std::size_t number = 0;            ///< of the client's request, from 1
     std::string request{};             ///< operation and path
-    Wrong wrong{};
+    Mismatch wrong{};
 };
 
 /** What was done and found, by one client or by all. */
-class Tally {
+class Statistics {
 public:
     using Time = std::chrono::nanoseconds;
 
     /** @param itsShown how many wrong answers are kept in words */
-    explicit Tally(std::size_t itsShown) : shown(itsShown) {}
+    explicit Statistics(std::size_t itsShown) : shown(itsShown) {}
 
-    void count(Deed deed, Time time, bool isWrong);
+    void count(OperationKind kind, Time time, bool isWrong);
     void note(WrongAnswer answer);
-    void add(const Tally& other);
+    void add(const Statistics& other);
 
-    const std::vector<Time>& times(Deed deed) const { return of(deed).times; }
-    std::size_t wrongOf(Deed deed) const { return of(deed).wrong; }
+    const std::vector<Time>& times(OperationKind kind) const { return of(kind).times; }
+    std::size_t wrongOf(OperationKind kind) const { return of(kind).wrong; }
     const std::map<std::string, std::size_t>& kinds() const { return wrongByKind; }
     std::size_t wrong() const;
 
@@ -42,15 +42,15 @@ public:
     std::vector<WrongAnswer> first() const;
 
 private:
-    struct OfDeed {
+    struct OfKind {
         std::vector<Time> times{};
         std::size_t wrong = 0;
     };
 
-    const OfDeed& of(Deed deed) const { return deeds[static_cast<std::size_t>(deed)]; }
+    const OfKind& of(OperationKind kind) const { return operations[static_cast<std::size_t>(kind)]; }
 
     std::size_t shown;
-    std::array<OfDeed, deedCount> deeds{};
+    std::array<OfKind, operationKindCount> operations{};
     std::map<std::string, std::size_t> wrongByKind{};
     std::vector<WrongAnswer> answers{};
 };
@@ -74,16 +74,16 @@ struct Report {
     std::uint64_t seed = 0;
     double seconds = 0;
     Figures all{};
-    std::vector<Figures> deeds{};  ///< those that were done
-    std::size_t wrong = 0;         ///< also those found at the end, which are no requests of a client
+    std::vector<Figures> operations{};  ///< those that were done
+    std::size_t wrong = 0;              ///< also those found at the end, which are no requests of a client
     std::map<std::string, std::size_t> kinds{};
     std::vector<WrongAnswer> first{};
 };
 
 /** The value below which that share of the times lies, 0 to 1; 0 without any. */
-double percentile(const std::vector<Tally::Time>& sorted, double share);
+double percentile(const std::vector<Statistics::Time>& sorted, double share);
 
-/** The report's figures out of the tally. */
-Report reportOf(const Tally& tally, double seconds);
+/** The report's figures out of the statistics. */
+Report reportOf(const Statistics& statistics, double seconds);
 
 }  // namespace cimhost::lab

@@ -64,7 +64,7 @@ Json wrongJson(const lab::WrongAnswer& answer) {
 
 std::string text::format(const lab::Report& report, const Style& style) {
     std::vector<Row> rows{{"", "requests", "wrong", "per second", "p50 us", "p95 us", "p99 us", "max us"}};
-    for (const lab::Figures& each : report.deeds) {
+    for (const lab::Figures& each : report.operations) {
         rows.push_back(rowOf(each));
     }
     rows.push_back(rowOf(report.all));
@@ -75,7 +75,7 @@ std::string text::format(const lab::Report& report, const Style& style) {
 
 std::string json::format(const lab::Report& report) {
     Json operations = Json::array();
-    for (const lab::Figures& each : report.deeds) {
+    for (const lab::Figures& each : report.operations) {
         operations.push_back(figuresJson(each));
     }
     Json first = Json::array();

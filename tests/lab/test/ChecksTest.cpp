@@ -14,9 +14,9 @@ std::string kindOf(const Verdict& verdict) {
 class ChecksTest : public testing::Test {
 protected:
     ChecksTest() {
-        ledger.created("load-c1-1", {{"Text", testsupport::text("x")}});
-        ledger.created("load-c1-2", {});
-        ledger.doubt("load-c1-3");
+        state.created("load-c1-1", {{"Text", testsupport::text("x")}});
+        state.created("load-c1-2", {});
+        state.doubt("load-c1-3");
     }
 
     Instance thing(const std::string& id, std::vector<cimhost::NamedValue> properties = {}) const {
@@ -33,8 +33,8 @@ protected:
 
     LoadClass known = depotClass();
     std::set<std::string> others{"old"};
-    Ledger ledger{};
-    Expectation expectation{known, others, ledger, "load-c1-", "load-"};
+    ExpectedState state{};
+    Expectation expectation{known, others, state, "load-c1-", "load-"};
 };
 
 TEST_F(ChecksTest, AStatusIsTheOneThatMustBe) {
@@ -58,7 +58,7 @@ TEST_F(ChecksTest, ACreatedPathIsTheOneAskedFor) {
 }
 
 TEST_F(ChecksTest, AnInstanceHasItsKeyAndTheValuesThatAreKnown) {
-    const Ledger::Values values{{"Text", testsupport::text("x")}};
+    const ExpectedState::Values values{{"Text", testsupport::text("x")}};
     const auto text = [](const char* value) { return testsupport::named("Text", testsupport::text(value)); };
     EXPECT_EQ(kindOf(checkInstance(known, thing("a", {text("x")}), "a", values)), "right");
     EXPECT_EQ(kindOf(checkInstance(known, thing("a", {text("y")}), "a", values)), "value");
@@ -79,10 +79,10 @@ TEST_F(ChecksTest, AListingHasAllThatMustBeThere) {
 
 TEST_F(ChecksTest, AListingHasNothingTwiceAndNothingElse) {
     EXPECT_EQ(listing({thing("load-c1-1")}), "duplicate");
-    EXPECT_EQ(listing({thing("load-c1-4")}), "ghost");
+    EXPECT_EQ(listing({thing("load-c1-4")}), "deleted");
     EXPECT_EQ(listing({thing("load-c1-3")}), "right") << "nobody knows";
     EXPECT_EQ(listing({thing("load-c2-1")}), "right") << "another client's";
-    EXPECT_EQ(listing({thing("odd")}), "stranger");
+    EXPECT_EQ(listing({thing("odd")}), "unknown");
     EXPECT_EQ(listing({thing("")}), "nameless");
     EXPECT_EQ(listing({{depotPath("Depot_Thing"), {}}}), "nameless");
 }

@@ -66,7 +66,7 @@ TEST_P(LoadAsManager, AProviderThatIsRightHasNoWrongAnswer) {
     const Report report = run({"Depot_Thing", "Depot_Shelf"});
     EXPECT_THAT(report.kinds, IsEmpty()) << firstOf(report);
     EXPECT_EQ(report.all.requests, 3200U);
-    EXPECT_EQ(report.deeds.size(), 6U);
+    EXPECT_EQ(report.operations.size(), 6U);
     EXPECT_EQ(report.clients, 16U);
     EXPECT_EQ(countOf("Depot_Thing"), 0U) << "nothing is left";
 }
@@ -92,9 +92,9 @@ TEST_P(LoadOnWrongClass, TellsWhatIsWrong) {
 }
 
 INSTANTIATE_TEST_SUITE_P(Depot, LoadOnWrongClass,
-                         testing::Values(WrongClass{"Depot_Liar", "value"}, WrongClass{"Depot_Hoarder", "ghost"},
+                         testing::Values(WrongClass{"Depot_Liar", "value"}, WrongClass{"Depot_Hoarder", "deleted"},
                                          WrongClass{"Depot_Forgetful", "missing"},
-                                         WrongClass{"Depot_Inventive", "stranger"},
+                                         WrongClass{"Depot_Inventive", "unknown"},
                                          WrongClass{"Depot_Nameless", "nameless"},
                                          WrongClass{"Depot_Repeating", "duplicate"},
                                          WrongClass{"Depot_Misnaming", "path"}, WrongClass{"Depot_Generous", "status"},

@@ -6,9 +6,9 @@
 
 namespace {
 
-using cimhost::lab::Deed;
 using cimhost::lab::LoadClass;
 using cimhost::lab::Mix;
+using cimhost::lab::OperationKind;
 using cimhost::lab::Plan;
 using cimhost::lab::PlanError;
 using cimhost::lab::Random;
@@ -29,20 +29,21 @@ TEST(Mix, DoesWhatIsNamedAsOftenAsItSays) {
     Random random(1, 1);
     int gets = 0;
     for (int i = 0; i < 4000; ++i) {
-        const Deed deed = mix.pick(random);
-        EXPECT_TRUE(deed == Deed::create || deed == Deed::get);
-        gets += deed == Deed::get ? 1 : 0;
+        const OperationKind kind = mix.pick(random);
+        EXPECT_TRUE(kind == OperationKind::create || kind == OperationKind::get);
+        gets += kind == OperationKind::get ? 1 : 0;
     }
     EXPECT_NEAR(gets, 3000, 150);
-    EXPECT_EQ(mix.weight(Deed::remove), 0U);
+    EXPECT_EQ(mix.weight(OperationKind::remove), 0U);
 }
 
 TEST(Mix, UsuallyDoesEverythingButAssociations) {
     const Mix mix;
-    for (const Deed deed : {Deed::create, Deed::modify, Deed::remove, Deed::enumerate, Deed::get}) {
-        EXPECT_GT(mix.weight(deed), 0U) << nameOf(deed);
+    for (const OperationKind kind : {OperationKind::create, OperationKind::modify, OperationKind::remove,
+                                     OperationKind::enumerate, OperationKind::get}) {
+        EXPECT_GT(mix.weight(kind), 0U) << nameOf(kind);
     }
-    EXPECT_EQ(mix.weight(Deed::associate), 0U);
+    EXPECT_EQ(mix.weight(OperationKind::associate), 0U);
 }
 
 TEST(Mix, RefusesWhatItCannotRead) {

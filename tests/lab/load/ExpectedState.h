@@ -12,7 +12,7 @@
 namespace cimhost::lab {
 
 /** What somebody was told of the instances of a class that are its own. */
-class Ledger {
+class ExpectedState {
 public:
     using Values = std::map<std::string, Value>;  ///< by property; what is not there is not known
 
@@ -34,8 +34,8 @@ public:
     /** One of the instances that are there. Not while it is empty. */
     std::string any(Random& random) const { return random.oneOf(ids); }
 
-    /** Takes over what another ledger knows of other instances. */
-    void add(const Ledger& other);
+    /** Takes over what another state knows of other instances. */
+    void add(const ExpectedState& other);
 
 private:
     void forget(const std::string& id);
