@@ -19,9 +19,9 @@ std::optional<std::string> optionalName(const char* name) {
 }
 
 /** Performs the request in the caller's context. Failure with the status of the response if it is not OK. */
-Response performed(const CMPIBroker* broker, const CMPIContext* context, Request request) {
+Response performed(Broker& broker, const CMPIContext* context, Request request) {
     request.context = entriesOf(context);
-    Response response = Broker::of(broker).upCalls().perform(std::move(request));
+    Response response = broker.upCalls().perform(std::move(request));
     if (!response.ok()) {
         throw Failure(std::move(response.status));
     }
@@ -46,7 +46,7 @@ CMPIEnumeration* enumerated(const CMPIBroker* handle, const CMPIContext* context
         Broker& broker = Broker::of(handle);
         Request request = makeRequest();
         const bool arePaths = returnsPaths(request.operation);
-        Response response = performed(handle, context, std::move(request));
+        Response response = performed(broker, context, std::move(request));
         return arePaths ? enumerationOf(broker, CMPI_ref, std::move(response.paths))
                         : enumerationOf(broker, CMPI_instance, std::move(response.instances));
     });
@@ -105,7 +105,7 @@ CMPIInstance* getInstance(const CMPIBroker* handle, const CMPIContext* context, 
     return guarded<CMPIInstance*>(rc, nullptr, [&] {
         Broker& broker = Broker::of(handle);
         Response response =
-            performed(handle, context, Request::getInstance(argument(path), propertyListFrom(properties)));
+            performed(broker, context, Request::getInstance(argument(path), propertyListFrom(properties)));
         return broker.arena().make<CMPIInstance>({onlyOne(response.instances), nullptr, {}});
     });
 }
@@ -115,7 +115,7 @@ CMPIObjectPath* createInstance(const CMPIBroker* handle, const CMPIContext* cont
     return guarded<CMPIObjectPath*>(rc, nullptr, [&] {
         Broker& broker = Broker::of(handle);
         Response response =
-            performed(handle, context, Request::createInstance(argument(path), argument(instance).value));
+            performed(broker, context, Request::createInstance(argument(path), argument(instance).value));
         return broker.arena().make<CMPIObjectPath>(onlyOne(response.paths));
     });
 }
@@ -123,13 +123,17 @@ CMPIObjectPath* createInstance(const CMPIBroker* handle, const CMPIContext* cont
 CMPIStatus modifyInstance(const CMPIBroker* handle, const CMPIContext* context, const CMPIObjectPath* path,
                           const CMPIInstance* instance, const char** properties) {
     return guarded([&] {
-        performed(handle, context,
+        Broker& broker = Broker::of(handle);
+        performed(broker, context,
                   Request::modifyInstance(argument(path), argument(instance).value, propertyListFrom(properties)));
     });
 }
 
 CMPIStatus deleteInstance(const CMPIBroker* handle, const CMPIContext* context, const CMPIObjectPath* path) {
-    return guarded([&] { performed(handle, context, Request::deleteInstance(argument(path))); });
+    return guarded([&] {
+        Broker& broker = Broker::of(handle);
+        performed(broker, context, Request::deleteInstance(argument(path)));
+    });
 }
 
 CMPIEnumeration* execQuery(const CMPIBroker* handle, const CMPIContext* context, const CMPIObjectPath* path,
@@ -180,7 +184,7 @@ CMPIData invokeMethod(const CMPIBroker* handle, const CMPIContext* context, cons
         static const std::vector<NamedValue> none;
         const auto& parameters = input == nullptr ? none : argument(input).values;
         Response response =
-            performed(handle, context, Request::invokeMethod(argument(path), argument(method), parameters));
+            performed(broker, context, Request::invokeMethod(argument(path), argument(method), parameters));
         if (output != nullptr) {
             argument(output).values = std::move(response.output);
         }
@@ -191,7 +195,8 @@ CMPIData invokeMethod(const CMPIBroker* handle, const CMPIContext* context, cons
 CMPIStatus setProperty(const CMPIBroker* handle, const CMPIContext* context, const CMPIObjectPath* path,
                        const char* name, const CMPIValue* value, CMPIType type) {
     return guarded([&] {
-        performed(handle, context, Request::setProperty(argument(path), argument(name), valueFrom(value, type)));
+        Broker& broker = Broker::of(handle);
+        performed(broker, context, Request::setProperty(argument(path), argument(name), valueFrom(value, type)));
     });
 }
 
@@ -199,7 +204,7 @@ CMPIData getProperty(const CMPIBroker* handle, const CMPIContext* context, const
                      CMPIStatus* rc) {
     return guarded(rc, badData(), [&] {
         Broker& broker = Broker::of(handle);
-        const Response response = performed(handle, context, Request::getProperty(argument(path), argument(name)));
+        const Response response = performed(broker, context, Request::getProperty(argument(path), argument(name)));
         return dataFrom(response.value, broker.arena());
     });
 }

@@ -72,7 +72,7 @@ void ObjectManager::completeContext(Request& request) const {
     for (const NamedValue& entry : baseContext) {
         addIfMissing(request.context, entry.name.c_str(), entry.value);
     }
-    addIfMissing(request.context, CMPIInvocationFlags, Value::of(std::uint32_t{0}));
+    addIfMissing(request.context, CMPIInvocationFlags, Value::of(CMPI_uint32, std::uint32_t{0}));
     addIfMissing(request.context, CMPIInitNameSpace, Value::of(request.path.nameSpace));
     addIfMissing(request.context, CMPIPrincipal, behaviour.principal());
 }

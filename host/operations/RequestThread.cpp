@@ -1,5 +1,9 @@
 #include "operations/RequestThread.h"
 
+#include <future>
+#include <thread>
+#include <utility>
+
 namespace cimhost {
 namespace {
 
@@ -21,6 +25,18 @@ ChainMember::ChainMember(RequestChain chain) {
 
 ChainMember::~ChainMember() {
     joinedChain() = nullptr;
+}
+
+void onNewThread(const std::function<void()>& body) {
+    const RequestChain chain = requestChain();
+    std::packaged_task<void()> task([&] {
+        const ChainMember member(chain);
+        body();
+    });
+    std::future<void> outcome = task.get_future();
+    std::thread thread(std::move(task));
+    thread.join();
+    outcome.get();
 }
 
 void ChainMutex::lock() {

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <condition_variable>
+#include <functional>
 #include <mutex>
 
 // Which requests belong together, on whatever threads they run.
@@ -21,6 +22,9 @@ public:
     ChainMember(const ChainMember&) = delete;
     ChainMember& operator=(const ChainMember&) = delete;
 };
+
+/** Runs the body on a new thread, which works for the caller's chain; rethrows what it throws. */
+void onNewThread(const std::function<void()>& body);
 
 /** A mutex that a chain of requests may lock again while it holds it, on another thread too. */
 class ChainMutex {

@@ -1,8 +1,6 @@
-#include "cli/Table.h"
+#include "cli/TextLayout.h"
 
 #include <gtest/gtest.h>
-
-#include "cli/Width.h"
 
 // Columns of letters that are wider, or narrower, than one column.
 

@@ -18,7 +18,7 @@ constexpr int rounds = 25;
 
 class ConcurrencyTest : public OperationsTest, public testing::WithParamInterface<Manager> {
 protected:
-    ConcurrencyTest() { options.manager = GetParam(); }
+    ConcurrencyTest() { options.behaviour = cimhost::lab::emulationOf(GetParam()); }
 
     void TearDown() override { started.reset(); }  // while there is something to log to
 

@@ -16,9 +16,6 @@ std::shared_ptr<const ManagerBehaviour> openPegasusEmulation(CreationKey creatio
 /** Versions and gaps of SFCB's tables. */
 void changeToSfcbTables(FunctionTables& tables);
 
-/** Runs the body on a new thread, which belongs to the caller's chain of requests; rethrows what it throws. */
-void onNewThread(const std::function<void()>& body);
-
 /** The status of a request that would have ended the manager's provider process. */
 Status crashed(const std::string& reason);
 

@@ -1,7 +1,3 @@
-#include <future>
-#include <thread>
-#include <utility>
-
 #include "lab/emulation/Emulations.h"
 #include "lab/emulation/TypeCoercion.h"
 #include "operations/RequestThread.h"
@@ -88,18 +84,6 @@ private:
 
 std::shared_ptr<const ManagerBehaviour> openPegasusEmulation(CreationKey creationKey) {
     return std::make_shared<OpenPegasusEmulation>(creationKey);
-}
-
-void onNewThread(const std::function<void()>& body) {
-    const RequestChain chain = requestChain();
-    std::packaged_task<void()> task([&] {
-        const ChainMember member(chain);
-        body();
-    });
-    std::future<void> outcome = task.get_future();
-    std::thread thread(std::move(task));
-    thread.join();
-    outcome.get();
 }
 
 Status crashed(const std::string& reason) {

@@ -3,6 +3,7 @@
 #include "broker/NamedValues.h"
 #include "lab/emulation/Emulations.h"
 #include "lab/emulation/TypeCoercion.h"
+#include "operations/RequestThread.h"
 
 namespace cimhost::lab {
 namespace {

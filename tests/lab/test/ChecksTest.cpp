@@ -4,7 +4,7 @@
 
 #include "lab/test/Depot.h"
 
-namespace cimhost::load {
+namespace cimhost::lab {
 namespace {
 
 std::string kindOf(const Verdict& verdict) {
@@ -104,4 +104,4 @@ TEST_F(ChecksTest, AssociationsAreThoseOfBefore) {
 }
 
 }  // namespace
-}  // namespace cimhost::load
+}  // namespace cimhost::lab

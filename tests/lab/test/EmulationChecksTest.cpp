@@ -36,8 +36,9 @@ protected:
         started.reset();
         options.behaviour = cimhost::lab::emulationOf(which);
         const NamedValue sent = testsupport::named(property, std::move(value));
-        return manager().perform(
-            cimhost::Request::modifyInstance(OperationsTest::named("Typed_Thing", "a"), {{}, {sent}}));
+        return manager()
+            .perform(cimhost::Request::modifyInstance(OperationsTest::named("Typed_Thing", "a"), {{}, {sent}}))
+            .status;
     }
 
     static Status statusOf(Manager which, std::size_t instances) {
