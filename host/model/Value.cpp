@@ -23,10 +23,6 @@ Value Value::of(Scalar scalar) {
     return of(type, std::move(scalar));
 }
 
-Value Value::of(const char* characters) {
-    return of(Scalar(std::string(characters)));
-}
-
 Value Value::of(CMPIType type, Scalar scalar) {
     if (std::holds_alternative<std::monostate>(scalar)) {
         return null(type);

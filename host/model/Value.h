@@ -2,6 +2,7 @@
 
 #include <cmpidt.h>
 
+#include <cstddef>
 #include <cstdint>
 #include <memory>
 #include <string>
@@ -43,7 +44,10 @@ struct Value {
 
     /** A single value of the scalar's own type. */
     static Value of(Scalar scalar);
-    static Value of(const char* characters);
+    template <std::size_t size>
+    static Value of(const char (&characters)[size]) {
+        return of(Scalar(std::string(characters)));
+    }
 
     /** A single value of a declared type; null if the scalar is null. */
     static Value of(CMPIType type, Scalar scalar);
