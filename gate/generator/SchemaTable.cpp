@@ -1,4 +1,4 @@
-// Writes the gate's table of classes from MOF: schema_table MOF-FILE OUTPUT.
+// Generates the gate's table of classes from MOF: schema_table MOF-FILE OUTPUT.
 
 #include <exception>
 #include <fstream>
@@ -30,7 +30,8 @@ void writeProperty(std::ostream& out, const Property& property) {
 }
 
 void writeTable(std::ostream& out, const cimhost::Schema& schema) {
-    out << std::boolalpha << "// Made from the MOF.\n#include \"Schema.h\"\n\nnamespace gate {\nnamespace {\n";
+    out << std::boolalpha
+        << "// Generated from the MOF.\n#include \"gate/cmpi/Schema.h\"\n\nnamespace gate {\nnamespace {\n";
     for (const Class* each : schema.classes()) {
         out << "\nconstexpr Property propertiesOf" << each->name << "[] = {\n";
         for (const Property& property : each->properties) {

@@ -77,7 +77,7 @@ protected:
      * file may have changed.
      */
     std::vector<Lines> possible(const Fault& fault, const std::string& message) const {
-        if (message.find("asset.dat may not be what it was before") == std::string::npos) {
+        if (message.find("asset.dat may differ from what it was before") == std::string::npos) {
             return {sorted(expected.before)};
         }
         if (fault.lasting) {  // reading or writing may fail again

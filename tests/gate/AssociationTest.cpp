@@ -241,7 +241,7 @@ TEST_F(AssociationTest, TheStatusAndReasonOfAFailedEnumerationAreInTheAnswerAndI
     for (const agentEnvironment::LogRecord& record : agentEnvironment::log()) {
         if (record.logger == "Tarvik.LeaseAndWarrantyGate") {
             EXPECT_EQ(record.level, 3000);
-            EXPECT_EQ(record.file, "Links.cpp");
+            EXPECT_EQ(record.file, "Associations.cpp");
             logged.push_back(record.channel + ": " + record.text);
         }
     }

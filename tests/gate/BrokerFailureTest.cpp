@@ -184,7 +184,7 @@ TEST_F(BrokerFailureTest, ComputersThatCannotAllBeHadAreNoGoodAnswer) {
 TEST_F(BrokerFailureTest, AReasonThatTheManagerDoesNotTakeIsAnsweredByAFixedText) {
     broker.answerNothingEver("CMPIBrokerEncFT.newString");
     EXPECT_THAT(gate().getInstance(keyedPath(lease, "missing")),
-                isRefused(CMPI_RC_ERR_NOT_FOUND, "could not take the reason"));
+                isRefused(CMPI_RC_ERR_NOT_FOUND, "error message could not be created"));
     EXPECT_THAT(gate().execQuery(classPath(lease), "WQL", "select"), isRefused(CMPI_RC_ERR_NOT_SUPPORTED, "Enumerate"));
 }
 

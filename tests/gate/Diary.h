@@ -1,6 +1,6 @@
 #pragma once
 
-#include "Gate.h"
+#include "gate/session/RequestLock.h"
 
 #include <algorithm>
 #include <chrono>
@@ -40,12 +40,12 @@ private:
     std::vector<std::string> events;
 };
 
-/** For those who close a gate and are not to wait in vain: it ends no test that goes well. */
+/** A timeout that no test reaches. */
 constexpr std::chrono::hours longEnough{1};
 
-/** Goes on when so many wait at the gate. */
-inline void awaitQueue(const gate::Gate& gate, std::size_t length) {
-    while (gate.waiting() < length) {
+/** Waits until that many threads wait for the lock. */
+inline void awaitQueue(const gate::RequestLock& lock, std::size_t length) {
+    while (lock.waiting() < length) {
         std::this_thread::yield();
     }
 }

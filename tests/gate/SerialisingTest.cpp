@@ -1,6 +1,7 @@
 #include <unistd.h>
 
 #include <algorithm>
+#include <atomic>
 #include <condition_variable>
 #include <cstdlib>
 #include <fstream>
@@ -11,6 +12,7 @@
 
 #include "ManagedGate.h"
 #include "Threads.h"
+#include "broker/RequestScope.h"
 #include "support/Files.h"
 #include "support/UnderTest.h"
 
@@ -142,6 +144,10 @@ TEST_F(SerialisingTest, ThroughTheGateOneRequestAtATimeIsInside) {
 
 TEST_F(SerialisingTest, NoKeyOrValueOfAClientIsReadWhileAnotherRequestIsInside) {
     const ObjectPath path = keyedPath(warranty, "W1");
+    const ObjectPath association =
+        testsupport::objectPath(nameSpace, warrantySetting,
+                                {named("Antecedent", testsupport::reference(computerPath("alpha"))),
+                                 named("Dependent", testsupport::reference(path))});
     const Instance sent = testsupport::instance(path, {named("Warrantor", text("Other"))});
     using Library = testsupport::ProviderLibrary;
     const std::function<void(Library&)> requests[] = {
@@ -149,6 +155,11 @@ TEST_F(SerialisingTest, NoKeyOrValueOfAClientIsReadWhileAnotherRequestIsInside) 
         [&](Library& library) { library.createInstance(keyedPath(warranty, "W2"), sent); },
         [&](Library& library) { library.modifyInstance(path, sent); },
         [&](Library& library) { library.deleteInstance(path); },
+        [&](Library& library) { library.getInstance(association); },
+        [&](Library& library) { library.associators(path, {}); },
+        [&](Library& library) { library.associatorNames(path, {}); },
+        [&](Library& library) { library.references(path, {}); },
+        [&](Library& library) { library.referenceNames(path, {}); },
     };
     for (const auto& request : requests) {
         testsupport::RecordingBroker broker;
@@ -175,6 +186,62 @@ TEST_F(SerialisingTest, NoKeyOrValueOfAClientIsReadWhileAnotherRequestIsInside) 
         second.join();
         EXPECT_EQ(readBehindLock, 0);
     }
+}
+
+/** A result that runs some work before it accepts a path. */
+class WorkingResult {
+public:
+    WorkingResult(const CMPIResult& real, std::function<void()> itsWork) : functions(*real.ft), result(real) {
+        work = std::move(itsWork);
+        original = functions.returnObjectPath;
+        functions.returnObjectPath = [](const CMPIResult* self, const CMPIObjectPath* path) {
+            work();
+            return original(self, path);
+        };
+        result.ft = &functions;
+    }
+    WorkingResult(const WorkingResult&) = delete;
+    WorkingResult& operator=(const WorkingResult&) = delete;
+
+    const CMPIResult* handle() const { return &result; }
+
+private:
+    static inline std::function<void()> work{};
+    static inline CMPIStatus (*original)(const CMPIResult*, const CMPIObjectPath*) = nullptr;
+
+    CMPIResultFT functions;
+    CMPIResult result;
+};
+
+TEST_F(SerialisingTest, ADeletionWaitsUntilTheCreationHasReturnedItsPath) {
+    testsupport::RecordingBroker broker;
+    testsupport::ProviderLibrary library(testsupport::underTest(GATE_LIBRARY), "LeaseAndWarrantyGate", broker);
+    CMPIInstanceMI* mi = library.instanceMI();
+    const ObjectPath path = keyedPath(lease, "L1");
+    std::atomic<pid_t> deleter{0};
+    std::atomic<bool> isDeleted{false};
+    std::thread deletion;
+    const auto deleteMeanwhile = [&] {
+        deletion = std::thread([&] {
+            deleter = gettid();
+            EXPECT_THAT(library.deleteInstance(path), isDone());
+            isDeleted = true;
+        });
+        while (deleter == 0 || !isAsleep(deleter)) {
+            std::this_thread::yield();
+        }
+        EXPECT_FALSE(isDeleted);
+    };
+    const Outcome created =
+        library.call([&](cimhost::RequestScope& scope, const CMPIContext* context, const CMPIResult* result) {
+            const WorkingResult working(*result, deleteMeanwhile);
+            return mi->ft->createInstance(mi, context, working.handle(), scope.objectPath(path),
+                                          scope.instance(testsupport::instance(path, {})));
+        });
+    EXPECT_THAT(created, isAnswered(1));
+    deletion.join();
+    EXPECT_TRUE(isDeleted);
+    EXPECT_THAT(library.enumerateInstanceNames(classPath(lease)), isAnswered(0));
 }
 
 TEST_F(SerialisingTest, WithoutItAllRequestsAreInsideAtOnce) {

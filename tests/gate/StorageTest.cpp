@@ -93,7 +93,7 @@ TEST_F(StorageTest, WhatIsNoRegularFileIsNotWrittenTo) {
     create("L1");
     fs::remove(dataFile("Lease.dat"));
     ASSERT_EQ(mkfifo(dataFile("Lease.dat").c_str(), 0600), 0);
-    EXPECT_THAT(create("L2"), isRefused(CMPI_RC_ERR_FAILED, "no regular file"));
+    EXPECT_THAT(create("L2"), isRefused(CMPI_RC_ERR_FAILED, "not a regular file"));
     EXPECT_THAT(identifiers(), ElementsAre("L1"));
 }
 

@@ -1,37 +1,34 @@
-#include "WrappedBroker.h"
-
-#include "Gate.h"
+#include "gate/cmpi/WrappedBroker.h"
 
 #include <gtest/gtest.h>
 
 #include <utility>
 
-// What goes on to the object manager's broker, and how.
+// Forwarding to the object manager's broker.
 
 namespace gatetest {
 namespace {
 
 using gate::WrappedBroker;
 
+bool isHeld = true;
+const WrappedBroker::Lock lock{[] { isHeld = false; }, [] { isHeld = true; }};
+
 /** An object manager's broker, which is more than the structure that providers know. */
 struct Manager : CMPIBroker {
     int calls = 0;
 };
 
-/** Counts a call that brought the manager's own pointer; an answer of zero. */
-template <auto slot, bool isUpCall>
+/** Counts calls with the manager's own pointer, and checks the lock. Returns zero. */
+template <auto slot, bool isService>
 struct Counting;
 
 template <class Table, class Result, class... Arguments, Result (*Table::*slot)(const CMPIBroker*, Arguments...),
-          bool isUpCall>
-struct Counting<slot, isUpCall> {
+          bool isService>
+struct Counting<slot, isService> {
     static Result call(const CMPIBroker* broker, Arguments...) {
         ++static_cast<Manager*>(const_cast<CMPIBroker*>(broker))->calls;
-        if (isUpCall) {
-            const gate::Turn turn;  // not to be had but while the gate stands open
-            const gate::Turn* const held = &turn;
-            EXPECT_NE(held, nullptr);
-        }
+        EXPECT_EQ(isHeld, !isService);
         return Result();
     }
 
@@ -41,15 +38,15 @@ struct Counting<slot, isUpCall> {
 };
 
 /** Fills a manager's slots, calls each through the wrapper, and expects it to arrive. */
-template <bool isUpCall, auto... slots, class Table>
+template <bool isService, auto... slots, class Table>
 void expectForwarded(Table& managers, Manager& manager, Table* CMPIBroker::*table) {
     manager.*table = &managers;
-    ((managers.*slots = &Counting<slots, isUpCall>::call), ...);
-    const WrappedBroker wrapped(&manager);
-    const gate::Turn turn;
+    ((managers.*slots = &Counting<slots, isService>::call), ...);
+    const WrappedBroker wrapped(&manager, lock);
     const Table& tables = *(wrapped.handle()->*table);
-    (Counting<slots, isUpCall>::callWrapped(tables, wrapped.handle()), ...);
+    (Counting<slots, isService>::callWrapped(tables, wrapped.handle()), ...);
     EXPECT_EQ(manager.calls, static_cast<int>(sizeof...(slots)));
+    EXPECT_TRUE(isHeld);
     manager.calls = 0;
 }
 
@@ -58,12 +55,12 @@ template <auto... slots, class Table>
 void expectMissing(Table* CMPIBroker::*table, Table& empty) {
     Manager manager{};
     manager.*table = &empty;
-    const WrappedBroker wrapped(&manager);
+    const WrappedBroker wrapped(&manager, lock);
     const Table& tables = *(wrapped.handle()->*table);
     EXPECT_TRUE(((tables.*slots == nullptr) && ...));
 }
 
-TEST(WrappedBrokerTest, EveryServiceGoesOnWithTheGateOpen) {
+TEST(WrappedBrokerTest, EveryServiceIsForwardedWithTheLockReleased) {
     Manager manager{};
     CMPIBrokerFT services{};
     using T = CMPIBrokerFT;
@@ -74,7 +71,7 @@ TEST(WrappedBrokerTest, EveryServiceGoesOnWithTheGateOpen) {
         services, manager, &CMPIBroker::bft);
 }
 
-TEST(WrappedBrokerTest, EveryMakerGoesOn) {
+TEST(WrappedBrokerTest, EveryConstructorIsForwarded) {
     Manager manager{};
     CMPIBrokerEncFT makers{};
     using T = CMPIBrokerEncFT;
@@ -84,7 +81,7 @@ TEST(WrappedBrokerTest, EveryMakerGoesOn) {
                     &T::newCMPIError, &T::openMessageFile, &T::closeMessageFile>(makers, manager, &CMPIBroker::eft);
 }
 
-TEST(WrappedBrokerTest, EveryMemoryFunctionGoesOn) {
+TEST(WrappedBrokerTest, EveryMemoryFunctionIsForwarded) {
     Manager manager{};
     CMPIBrokerMemFT memory{};
     using T = CMPIBrokerMemFT;
@@ -93,7 +90,7 @@ TEST(WrappedBrokerTest, EveryMemoryFunctionGoesOn) {
                     &T::freeDateTime, &T::freeSelectExp>(memory, manager, &CMPIBroker::mft);
 }
 
-TEST(WrappedBrokerTest, WhatTheManagerLacksIsLackingHere) {
+TEST(WrappedBrokerTest, FunctionsThatTheManagerLacksAreLacking) {
     CMPIBrokerFT services{};
     expectMissing<&CMPIBrokerFT::enumerateInstances, &CMPIBrokerFT::getProperty>(&CMPIBroker::bft, services);
     CMPIBrokerEncFT makers{};
@@ -102,7 +99,7 @@ TEST(WrappedBrokerTest, WhatTheManagerLacksIsLackingHere) {
     CMPIBrokerMemFT memory{};
     expectMissing<&CMPIBrokerMemFT::cmpiMalloc, &CMPIBrokerMemFT::mark>(&CMPIBroker::mft, memory);
     Manager bare{};
-    EXPECT_EQ(WrappedBroker(&bare).handle()->mft, nullptr);
+    EXPECT_EQ(WrappedBroker(&bare, lock).handle()->mft, nullptr);
 }
 
 TEST(WrappedBrokerTest, VersionsNameAndThreadTableAreTheManagers) {
@@ -117,7 +114,7 @@ TEST(WrappedBrokerTest, VersionsNameAndThreadTableAreTheManagers) {
     manager.bft = &services;
     manager.eft = &makers;
     manager.xft = &threads;
-    const WrappedBroker wrapped(&manager);
+    const WrappedBroker wrapped(&manager, lock);
     EXPECT_EQ(wrapped.handle()->bft->brokerCapabilities, 5U);
     EXPECT_EQ(wrapped.handle()->bft->brokerVersion, 0U);
     EXPECT_STREQ(wrapped.handle()->bft->brokerName, "some manager");
@@ -125,16 +122,16 @@ TEST(WrappedBrokerTest, VersionsNameAndThreadTableAreTheManagers) {
     EXPECT_EQ(wrapped.handle()->xft, &threads);
 }
 
-TEST(WrappedBrokerTest, NotesAnswersThatCannotBeMade) {
+TEST(WrappedBrokerTest, RecordsAnswersThatCannotBeCreated) {
     Manager manager{};
     CMPIBrokerEncFT makers{};
     makers.newObjectPath = &Counting<&CMPIBrokerEncFT::newObjectPath, false>::call;
     makers.newDateTimeFromChars = &Counting<&CMPIBrokerEncFT::newDateTimeFromChars, false>::call;
     manager.eft = &makers;
-    WrappedBroker wrapped(&manager);
+    WrappedBroker wrapped(&manager, lock);
     const CMPIBroker* broker = wrapped.handle();
     EXPECT_EQ(broker->eft->newDateTimeFromChars(broker, "no date", nullptr), nullptr);
-    EXPECT_FALSE(wrapped.hasFailed()) << "a text that is no date is no failure";
+    EXPECT_FALSE(wrapped.hasFailed()) << "a string that is not a datetime is not a failure";
     EXPECT_EQ(broker->eft->newObjectPath(broker, "root", "C", nullptr), nullptr);
     EXPECT_TRUE(wrapped.hasFailed());
     wrapped.forgetFailures();

@@ -1,0 +1,59 @@
+#pragma once
+
+#include <cmpift.h>
+
+#include <string>
+#include <utility>
+
+// How requests fail, and the messages for that.
+
+namespace gate {
+
+/** Ends a request with a status. The message is for a person who can fix the cause. */
+struct Failure {
+    CMPIrc rc;
+    std::string message;
+};
+
+/** Ends a request whose object manager is shutting down or has ended. Its broker must not be used any more. */
+struct ManagerGone {};
+
+[[noreturn]] inline void fail(CMPIrc rc, std::string message) {
+    throw Failure{rc, std::move(message)};
+}
+
+/**
+ * A CMPI string over characters that exist elsewhere, made without a broker and without memory. Releasing and cloning
+ * it have no effect. Its handle is the characters: some object managers read a message there instead of through its
+ * function table.
+ */
+class StaticString {
+public:
+    explicit constexpr StaticString(const char* characters) : string{const_cast<char*>(characters), &functions} {}
+
+    CMPIString* handle() { return &string; }
+
+private:
+    static void setOk(CMPIStatus* rc) {
+        if (rc != nullptr) {
+            *rc = {CMPI_RC_OK, nullptr};
+        }
+    }
+
+    static inline CMPIStringFT functions{CMPIVersion200,
+                                         [](CMPIString*) {
+                                             return CMPIStatus{CMPI_RC_OK, nullptr};
+                                         },
+                                         [](const CMPIString* string, CMPIStatus* rc) {
+                                             setOk(rc);
+                                             return const_cast<CMPIString*>(string);
+                                         },
+                                         [](const CMPIString* string, CMPIStatus* rc) {
+                                             setOk(rc);
+                                             return static_cast<const char*>(string->hdl);
+                                         }};
+
+    CMPIString string;
+};
+
+}  // namespace gate

@@ -1,0 +1,258 @@
+#include "Objects.h"
+
+#include <charconv>
+#include <cstdint>
+#include <limits>
+
+namespace gate {
+
+std::string toString(const CMPIString* string) {
+    return cim::charactersOf(string).value_or(std::string());
+}
+
+bool isAbsent(const CMPIStatus& status) {
+    return status.rc == CMPI_RC_ERR_NOT_FOUND || status.rc == CMPI_RC_ERR_NO_SUCH_PROPERTY;
+}
+
+std::string managerFailure(const char* task, const CMPIStatus& status) {
+    std::string message = std::string("The object manager could not ") + task;
+    if (status.rc != CMPI_RC_OK) {
+        message += ": code " + std::to_string(status.rc);
+        const std::string reason = toString(status.msg);
+        message += reason.empty() ? "" : ", " + reason;
+    }
+    return message + ".";
+}
+
+void require(bool isDone, const char* task, const CMPIStatus& status) {
+    if (!isDone) {
+        fail(CMPI_RC_ERR_FAILED, managerFailure(task, status));
+    }
+}
+
+std::string classNameOf(const CMPIObjectPath* path) {
+    return toString(demand<&CMPIObjectPathFT::getClassName>("return the class of a path", path));
+}
+
+std::string nameSpaceOf(const CMPIObjectPath* path) {
+    return toString(demand<&CMPIObjectPathFT::getNameSpace>("return the namespace of a path", path));
+}
+
+CMPICount keyCountOf(const CMPIObjectPath* path) {
+    return demand<&CMPIObjectPathFT::getKeyCount>("count the keys of a path", path);
+}
+
+const CMPIObjectPath* pathOf(const CMPIInstance* instance) {
+    const auto answer = ask<&CMPIInstanceFT::getObjectPath>(instance);
+    require(answer.isOk() && answer.value != nullptr, "return the path of an instance", answer.status);
+    return answer.value;
+}
+
+CMPIObjectPath* makePath(const CMPIBroker* broker, const std::string& nameSpace, const char* className) {
+    CMPIObjectPath* path = make<&CMPIBrokerEncFT::newObjectPath>(broker, nameSpace.c_str(), className);
+    require(path != nullptr, "create an object path");
+    return path;
+}
+
+CMPIInstance* makeInstance(const CMPIBroker* broker, const CMPIObjectPath* path) {
+    CMPIInstance* instance = make<&CMPIBrokerEncFT::newInstance>(broker, path);
+    require(instance != nullptr, "create an instance");
+    return instance;
+}
+
+namespace {
+
+std::optional<std::string> charactersOf(const char* characters) {
+    return characters == nullptr ? std::nullopt : std::optional<std::string>(characters);
+}
+
+/** A datetime's characters; none if the object manager passed a null pointer as the value. */
+std::optional<std::string> charactersOf(const CMPIDateTime* dateTime) {
+    return cim::charactersOf(ask<&CMPIDateTimeFT::getStringFormat>(dateTime).value);
+}
+
+/** Converts a value by its own type; none for a type that no class here has. */
+std::optional<std::string> charactersOf(const CMPIData& data) {
+    const CMPIValue& value = data.value;
+    switch (data.type) {
+        case CMPI_chars:
+            return charactersOf(value.chars);
+        case CMPI_string:
+            return cim::charactersOf(value.string);
+        case CMPI_dateTime:
+            return charactersOf(value.dateTime);
+        case CMPI_boolean:
+            return value.boolean != 0 ? "true" : "false";
+        case CMPI_uint8:
+            return std::to_string(value.uint8);
+        case CMPI_uint16:
+            return std::to_string(value.uint16);
+        case CMPI_uint32:
+            return std::to_string(value.uint32);
+        case CMPI_uint64:
+            return std::to_string(value.uint64);
+        case CMPI_sint8:
+            return std::to_string(value.sint8);
+        case CMPI_sint16:
+            return std::to_string(value.sint16);
+        case CMPI_sint32:
+            return std::to_string(value.sint32);
+        case CMPI_sint64:
+            return std::to_string(value.sint64);
+        default:
+            return std::nullopt;
+    }
+}
+
+bool isString(CMPIType type) {
+    return type == CMPI_string || type == CMPI_chars;
+}
+
+bool isInteger(CMPIType type) {
+    return (type & CMPI_INTEGER) != 0 && (type & (CMPI_ENC | CMPI_ARRAY)) == 0;
+}
+
+/** Whether a value of a type is accepted for a property of another: managers do not keep types apart strictly. */
+bool isConvertible(CMPIType given, CMPIType wanted) {
+    switch (wanted) {
+        case CMPI_string:
+            return isString(given);
+        case CMPI_dateTime:
+            return given == CMPI_dateTime || isString(given);
+        case CMPI_boolean:
+            return given == CMPI_boolean;
+        default:
+            return isInteger(given);
+    }
+}
+
+std::optional<std::uint32_t> numberIn(const std::string& digits) {
+    std::uint32_t number = 0;
+    const char* end = digits.data() + digits.size();
+    const auto [last, error] = std::from_chars(digits.data(), end, number);
+    return error == std::errc() && last == end ? std::optional<std::uint32_t>(number) : std::nullopt;
+}
+
+/** Whether an integer is in the range of its type; true for other types. */
+bool fits(const std::string& characters, CMPIType wanted) {
+    if (wanted != CMPI_uint32 && wanted != CMPI_uint16) {
+        return true;
+    }
+    const auto number = numberIn(characters);
+    return number && (wanted == CMPI_uint32 || *number <= std::numeric_limits<std::uint16_t>::max());
+}
+
+void add(CMPIObjectPath* path, const char* name, const CMPIValue* value, CMPIType type) {
+    const CMPIStatus status = tell<&CMPIObjectPathFT::addKey>(path, name, value, type);
+    require(status.rc == CMPI_RC_OK, "add a key", status);
+}
+
+CMPIValue reference(const CMPIObjectPath* target) {
+    CMPIValue value{};
+    value.ref = const_cast<CMPIObjectPath*>(target);
+    return value;
+}
+
+/** Converts what a getter returned for a property, or fails. None if the value is absent or null. */
+std::optional<std::string> convert(const CMPIData& data, const CMPIStatus& status, const Property& property) {
+    if (isAbsent(status)) {
+        return std::nullopt;
+    }
+    require(status.rc == CMPI_RC_OK, (std::string("return the value of ") + property.name).c_str(), status);
+    if (!cim::hasValue(data)) {
+        return std::nullopt;
+    }
+    if (!isConvertible(data.type, property.type)) {
+        fail(CMPI_RC_ERR_TYPE_MISMATCH, std::string(property.name) + ": the value has another type than the property.");
+    }
+    auto characters = charactersOf(data);
+    if (characters && !fits(*characters, property.type)) {
+        fail(CMPI_RC_ERR_TYPE_MISMATCH,
+             std::string(property.name) + ": " + *characters + " is out of the range of the property's type.");
+    }
+    return characters;
+}
+
+/** Whether the second path has that key of the first one. */
+bool sameKey(const CMPIData& key, const char* name, const CMPIObjectPath* other) {
+    const CMPIStatus status = ask<&CMPIObjectPathFT::getKey>(other, name).status;
+    require(status.rc == CMPI_RC_OK || isAbsent(status), "return the keys of a path", status);
+    if (key.type == CMPI_ref) {
+        const CMPIObjectPath* target = referenceOf(other, name);
+        return target != nullptr && samePath(key.value.ref, target);
+    }
+    const CMPIType type = key.type == CMPI_chars ? CMPI_string : key.type;
+    const Property property{name, type, true, false, nullptr};
+    const auto value = convert(key, {CMPI_RC_OK, nullptr}, property);
+    return value && value == keyOf(other, property);
+}
+
+}  // namespace
+
+std::optional<std::string> propertyOf(const CMPIInstance* instance, const Property& property) {
+    const auto answer = ask<&CMPIInstanceFT::getProperty>(instance, property.name);
+    return convert(answer.value, answer.status, property);
+}
+
+std::optional<std::string> keyOf(const CMPIObjectPath* path, const Property& property) {
+    const auto answer = ask<&CMPIObjectPathFT::getKey>(path, property.name);
+    const bool isUsable =
+        answer.isOk() && cim::hasValue(answer.value) && isConvertible(answer.value.type, property.type);
+    return isUsable ? charactersOf(answer.value) : std::nullopt;
+}
+
+CMPIObjectPath* referenceOf(const CMPIObjectPath* path, const char* key) {
+    const auto answer = ask<&CMPIObjectPathFT::getKey>(path, key);
+    const bool isUsable = answer.isOk() && cim::hasValue(answer.value) && answer.value.type == CMPI_ref;
+    return isUsable ? answer.value.value.ref : nullptr;
+}
+
+CMPIValue scalarFrom(const std::string& characters, CMPIType type) {
+    CMPIValue value{};
+    if (type == CMPI_boolean) {
+        value.boolean = characters == "true" ? 1 : 0;
+    } else if (type == CMPI_uint16) {
+        value.uint16 = static_cast<CMPIUint16>(numberIn(characters).value_or(0));
+    } else {
+        value.uint32 = numberIn(characters).value_or(0);
+    }
+    return value;
+}
+
+void setReference(const CMPIInstance* instance, const char* name, const CMPIObjectPath* target) {
+    const CMPIValue value = reference(target);
+    const CMPIStatus status = tell<&CMPIInstanceFT::setProperty>(instance, name, &value, CMPIType{CMPI_ref});
+    require(status.rc == CMPI_RC_OK, "set a property", status);
+}
+
+void addKey(CMPIObjectPath* path, const char* name, const std::string& characters) {
+    // In CMPI, the pointer to a value of type CMPI_chars is the pointer to its characters.
+    add(path, name, reinterpret_cast<const CMPIValue*>(characters.c_str()), CMPI_chars);
+}
+
+void addReference(CMPIObjectPath* path, const char* name, const CMPIObjectPath* target) {
+    const CMPIValue value = reference(target);
+    add(path, name, &value, CMPI_ref);
+}
+
+bool samePath(const CMPIObjectPath* left, const CMPIObjectPath* right) {
+    const CMPICount count = keyCountOf(left);
+    if (count == 0 || count != keyCountOf(right) || !sameName(classNameOf(left), classNameOf(right))) {
+        return false;
+    }
+    const std::string leftSpace = nameSpaceOf(left);
+    const std::string rightSpace = nameSpaceOf(right);
+    if (!leftSpace.empty() && !rightSpace.empty() && !sameName(leftSpace, rightSpace)) {
+        return false;
+    }
+    for (CMPICount index = 0; index < count; ++index) {
+        CMPIString* name = nullptr;
+        const CMPIData key = demand<&CMPIObjectPathFT::getKeyAt>("return the keys of a path", left, index, &name);
+        if (!sameKey(key, toString(name).c_str(), right)) {
+            return false;
+        }
+    }
+    return true;
+}
+
+}  // namespace gate

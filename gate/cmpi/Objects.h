@@ -1,0 +1,102 @@
+#pragma once
+
+#include "Failure.h"
+#include "Schema.h"
+#include "cim/CmpiAccess.h"
+
+#include <cmpift.h>
+
+#include <optional>
+#include <string>
+#include <utility>
+#include <vector>
+
+// Calls of the object manager's functions, and of its paths and instances, which it frees when the request ends.
+
+namespace gate {
+
+using cim::ask;
+using cim::make;
+using cim::tell;
+
+/** The characters of a string; empty if any part of it is missing. */
+std::string toString(const CMPIString* string);
+
+/** Whether a status says that a key or property does not exist. */
+bool isAbsent(const CMPIStatus& status);
+
+/** Says what the object manager could not do, with its status and its reason if it returned one. */
+std::string managerFailure(const char* task, const CMPIStatus& status);
+
+/** Fails with managerFailure() if the object manager could not do its task. */
+void require(bool isDone, const char* task, const CMPIStatus& status = {CMPI_RC_OK, nullptr});
+
+/** The result of a call that has to succeed. */
+template <auto function, class Object, class... Arguments>
+auto demand(const char* task, Object* object, Arguments... arguments) {
+    const auto answer = ask<function>(object, arguments...);
+    require(answer.isOk(), task, answer.status);
+    return answer.value;
+}
+
+/** @name Parts and creation of objects, which fail if the object manager does */
+///@{
+std::string classNameOf(const CMPIObjectPath* path);
+std::string nameSpaceOf(const CMPIObjectPath* path);
+CMPICount keyCountOf(const CMPIObjectPath* path);
+const CMPIObjectPath* pathOf(const CMPIInstance* instance);
+
+/** A path without keys. */
+CMPIObjectPath* makePath(const CMPIBroker* broker, const std::string& nameSpace, const char* className);
+
+/** An instance without properties. */
+CMPIInstance* makeInstance(const CMPIBroker* broker, const CMPIObjectPath* path);
+///@}
+
+// The gate compares and checks values as C++ strings, whatever their CIM type: the characters of a string or datetime,
+// the decimal digits of an integer, "true" or "false" of a boolean. The schema has the type.
+
+/** Values of properties, each property once. */
+using Values = std::vector<std::pair<const Property*, std::string>>;
+
+/** The datetime that the provider writes where there is no date. */
+constexpr const char* noDate = "00000000000000.000000-000";
+
+/**
+ * Reads a property of an instance. None if it is absent or null. Fails with CMPI_RC_ERR_TYPE_MISMATCH if the value has
+ * another type or is too large, and if the object manager cannot read it.
+ */
+std::optional<std::string> propertyOf(const CMPIInstance* instance, const Property& property);
+
+/** The values of an instance's properties that are wanted and have one. */
+template <class IsWanted>
+Values valuesOf(const CMPIInstance* instance, const Class& owner, IsWanted isWanted) {
+    Values values;
+    for (const Property& property : owner) {
+        if (const auto value = isWanted(property) ? propertyOf(instance, property) : std::nullopt) {
+            values.emplace_back(&property, *value);
+        }
+    }
+    return values;
+}
+
+/** Reads a key that is not a reference. None also if it has another type or the object manager cannot read it. */
+std::optional<std::string> keyOf(const CMPIObjectPath* path, const Property& property);
+
+/** The object that a key refers to; null if there is none. */
+CMPIObjectPath* referenceOf(const CMPIObjectPath* path, const char* key);
+
+/** An integer or boolean as a CMPI value. */
+CMPIValue scalarFrom(const std::string& characters, CMPIType type);
+
+/** @name Setters, which fail if the object manager does */
+///@{
+void setReference(const CMPIInstance* instance, const char* name, const CMPIObjectPath* target);
+void addKey(CMPIObjectPath* path, const char* name, const std::string& characters);
+void addReference(CMPIObjectPath* path, const char* name, const CMPIObjectPath* target);
+///@}
+
+/** Whether two paths have keys and name the same instance. Namespaces are compared where both paths have one. */
+bool samePath(const CMPIObjectPath* left, const CMPIObjectPath* right);
+
+}  // namespace gate

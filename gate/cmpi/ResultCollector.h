@@ -1,0 +1,53 @@
+#pragma once
+
+#include <cmpift.h>
+
+#include <vector>
+
+namespace gate {
+
+/**
+ * A CMPI result that collects the provider's answers, so that they can be checked before any is returned. The answers
+ * belong to the object manager, which frees them when the request ends.
+ */
+struct ResultCollector {
+    ResultCollector() : handle{this, &functions} {}
+    ResultCollector(const ResultCollector&) = delete;
+    ResultCollector& operator=(const ResultCollector&) = delete;
+
+    std::vector<const CMPIInstance*> instances{};
+    std::vector<const CMPIObjectPath*> paths{};
+    bool isDone = false;  ///< whether the provider called returnDone
+    CMPIResult handle;
+
+private:
+    static ResultCollector& of(const CMPIResult* result) { return *static_cast<ResultCollector*>(result->hdl); }
+
+    static constexpr CMPIStatus ok{CMPI_RC_OK, nullptr};
+    static constexpr CMPIStatus notSupported{CMPI_RC_ERR_NOT_SUPPORTED, nullptr};
+
+    static inline CMPIResultFT functions{CMPIVersion200,
+                                         [](CMPIResult*) { return ok; },
+                                         [](const CMPIResult*, CMPIStatus* rc) {
+                                             if (rc != nullptr) {
+                                                 *rc = notSupported;
+                                             }
+                                             return static_cast<CMPIResult*>(nullptr);
+                                         },
+                                         [](const CMPIResult*, const CMPIValue*, CMPIType) { return notSupported; },
+                                         [](const CMPIResult* result, const CMPIInstance* instance) {
+                                             of(result).instances.push_back(instance);
+                                             return ok;
+                                         },
+                                         [](const CMPIResult* result, const CMPIObjectPath* path) {
+                                             of(result).paths.push_back(path);
+                                             return ok;
+                                         },
+                                         [](const CMPIResult* result) {
+                                             of(result).isDone = true;
+                                             return ok;
+                                         },
+                                         [](const CMPIResult*, const CMPIError*) { return notSupported; }};
+};
+
+}  // namespace gate

@@ -1,0 +1,48 @@
+#pragma once
+
+#include <cmpidt.h>
+
+#include <cstddef>
+#include <string_view>
+
+namespace gate {
+
+/** A property or reference of a class. */
+struct Property {
+    const char* name;
+    CMPIType type;
+    bool isKey;
+    bool isWritable;
+    const char* referenceClass;  ///< of a reference; null otherwise
+};
+
+/** A class as the MOF declares it. */
+struct Class {
+    const char* name;
+    bool isAssociation;
+    const Property* properties;
+    std::size_t propertyCount;
+
+    const Property* begin() const { return properties; }
+    const Property* end() const { return properties + propertyCount; }
+};
+
+/** All classes. The table is generated from the MOF when the library is built. */
+struct Classes {
+    const Class* begin() const;
+    const Class* end() const;
+};
+
+/** The class of computers. Another provider serves it; each association has a computer at one end. */
+constexpr const char* computerClass = "VELKO_ComputerSystem";
+
+/** Compares names of CIM, in which letter case does not count. */
+bool sameName(std::string_view left, std::string_view right);
+
+/** The class of that name; null for one that the MOF does not declare. */
+const Class* findClass(std::string_view name);
+
+/** The class's property of that name; null when it has none. */
+const Property* findProperty(const Class& owner, std::string_view name);
+
+}  // namespace gate

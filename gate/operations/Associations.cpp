@@ -1,0 +1,339 @@
+#include "Operations.h"
+
+#include <RZLog/RZLogger.h>
+
+#include <algorithm>
+#include <exception>
+
+// All association requests return the same facts: the object manager knows the computers, and the provider knows which
+// lease or warranty belongs to each.
+
+namespace gate {
+
+namespace {
+
+/** A computer that the object manager knows. */
+struct Computer {
+    const CMPIObjectPath* path;
+    const CMPIInstance* instance;
+};
+
+/** The two ends of an association. */
+struct AssociationPair {
+    Computer computer;
+    const CMPIObjectPath* element;  ///< what belongs to the computer
+};
+
+using Pairs = std::vector<AssociationPair>;
+
+/** Writes an error to the log and trace of the agent. If the process is out of memory, nothing is written. */
+void logError(const std::string& message, const char* function = __builtin_FUNCTION(), int line = __builtin_LINE()) {
+    constexpr const char* logger = "Tarvik.LeaseAndWarrantyGate";
+    constexpr const char* file = "Associations.cpp";
+    constexpr int errorLevel = 3000;
+    try {
+        RZLog::RZLogger::logLevelMessage(function, file, line, logger, errorLevel, nullptr, 0, 0, message);
+        RZLog::RZLogger::traceLevelMessage(function, file, line, logger, errorLevel, nullptr, 0, 0, message);
+    } catch (const std::exception&) {
+        // The client still receives the message.
+    }
+}
+
+/** Fails unless the computers could be enumerated. Logs the reason, too, since clients often drop it. */
+void requireEnumerated(bool isDone, const CMPIStatus& status) {
+    if (!isDone) {
+        const std::string message = managerFailure("enumerate VELKO_ComputerSystem", status);
+        logError(message);
+        fail(CMPI_RC_ERR_FAILED, message);
+    }
+}
+
+CMPIEnumeration* enumerateComputers(const Request& request, ProviderSession& session) {
+    const CMPIBroker* broker = session.broker();
+    if (broker->bft == nullptr || broker->bft->enumerateInstances == nullptr) {
+        fail(CMPI_RC_ERR_FAILED, "The object manager cannot enumerate computers.");
+    }
+    const CMPIObjectPath* classPath = makePath(broker, nameSpaceOf(request.path), computerClass);
+    CMPIStatus status{CMPI_RC_OK, nullptr};
+    CMPIEnumeration* computers = nullptr;
+    session.releaseFor(
+        [&] { computers = broker->bft->enumerateInstances(broker, request.context, classPath, nullptr, &status); });
+    requireEnumerated(status.rc == CMPI_RC_OK && computers != nullptr, status);
+    return computers;
+}
+
+bool hasNext(CMPIEnumeration* computers) {
+    const auto answer = ask<&CMPIEnumerationFT::hasNext>(computers);
+    requireEnumerated(answer.isOk(), answer.status);
+    return answer.value != 0;
+}
+
+/** A copy of the instance's path with the request's namespace, which some managers omit. */
+const CMPIObjectPath* computerPathOf(const Request& request, const CMPIBroker* broker, const CMPIInstance* instance) {
+    const CMPIObjectPath* given = pathOf(instance);
+    const Property& name = *findProperty(*findClass(computerClass), "Name");
+    require(keyOf(given, name).has_value(), "name a computer");
+    CMPIObjectPath* path = makePath(broker, nameSpaceOf(request.path), classNameOf(given).c_str());
+    const CMPICount count = keyCountOf(given);
+    for (CMPICount index = 0; index < count; ++index) {
+        CMPIString* keyName = nullptr;
+        const auto data = ask<&CMPIObjectPathFT::getKeyAt>(given, index, &keyName);
+        const CMPIStatus status =
+            tell<&CMPIObjectPathFT::addKey>(path, toString(keyName).c_str(), &data.value.value, data.value.type);
+        require(data.isOk() && status.rc == CMPI_RC_OK, "name a computer", status);
+    }
+    return path;
+}
+
+/** Enumerates the computers in the request's namespace, each once. Releases the lock for it. */
+std::vector<Computer> knownComputers(const Request& request, ProviderSession& session) {
+    std::vector<Computer> computers;
+    CMPIEnumeration* enumeration = enumerateComputers(request, session);
+    while (hasNext(enumeration)) {
+        const auto next = ask<&CMPIEnumerationFT::getNext>(enumeration);
+        CMPIInstance* instance = next.isOk() ? cim::elementInstance(next.value) : nullptr;
+        requireEnumerated(instance != nullptr, next.status);
+        const CMPIObjectPath* path = computerPathOf(request, session.broker(), instance);
+        if (nameSpaceOf(pathOf(instance)).empty()) {
+            // Makes the instance's path complete, too, if the manager can.
+            tell<&CMPIInstanceFT::setObjectPath>(instance, path);
+        }
+        const bool isKnown = std::any_of(computers.begin(), computers.end(),
+                                         [&](const Computer& each) { return samePath(each.path, path); });
+        if (!isKnown) {
+            computers.push_back({path, instance});
+        }
+    }
+    return computers;
+}
+
+/** The pairs of an association, in the order of the computers. The provider knows the elements of each. */
+Pairs pairsOf(const ProviderSession& session, const std::vector<Computer>& computers, const Class& association) {
+    Pairs pairs;
+    for (const Computer& computer : computers) {
+        const LocalObjectPath path = localPath(computer.path, *findClass(computerClass));
+        for (const CMPIObjectPath* element : session.associatorNames(path, association)) {
+            pairs.push_back({computer, element});
+        }
+    }
+    return pairs;
+}
+
+bool isAny(const char* name) {
+    return name == nullptr || *name == '\0';
+}
+
+bool matches(const char* filter, const char* name) {
+    return isAny(filter) || sameName(filter, name);
+}
+
+/** Whether a path's class is the class or, as the object manager knows, a subclass of it. */
+bool isA(const Request& request, const CMPIObjectPath* path, const char* className) {
+    const CMPIBroker* broker = request.broker();
+    const std::string pathsClass = classNameOf(path);
+    if (sameName(pathsClass, className)) {
+        return true;
+    }
+    // No class of the MOF is a subclass of another.
+    const bool areBothKnown = findClass(pathsClass) != nullptr && findClass(className) != nullptr;
+    if (areBothKnown || broker->eft == nullptr || broker->eft->classPathIsA == nullptr) {
+        return false;
+    }
+    CMPIStatus status{CMPI_RC_OK, nullptr};
+    const bool answer = broker->eft->classPathIsA(broker, path, className, &status) != 0;
+    return answer && status.rc == CMPI_RC_OK;
+}
+
+bool isComputerEnd(const Property& end) {
+    return sameName(end.referenceClass, computerClass);
+}
+
+const CMPIObjectPath* pathAt(const Property& end, const AssociationPair& pair) {
+    return isComputerEnd(end) ? pair.computer.path : pair.element;
+}
+
+/** A direction of an association. */
+struct Traversal {
+    const Class* association;
+    const Property* source;
+    const Property* target;
+};
+
+/**
+ * A client's restriction. Names ignore letter case; null and the empty string mean any. The role is the property of the
+ * association that refers to the source, the result role the one that refers to the target.
+ */
+struct AssociationFilter {
+    const char* associationClass;
+    const char* role;
+    const char* resultRole;
+};
+
+/** The traversals that begin at the request's path and that the filter admits. */
+std::vector<Traversal> traversalsFrom(const Request& request, const AssociationFilter& filter) {
+    std::vector<Traversal> traversals;
+    for (const Class& association : Classes()) {
+        if (!association.isAssociation || !matches(filter.associationClass, association.name)) {
+            continue;
+        }
+        const Property* one = association.begin();
+        const Property* other = one + 1;
+        for (const Traversal& each : {Traversal{&association, one, other}, Traversal{&association, other, one}}) {
+            if (matches(filter.role, each.source->name) && matches(filter.resultRole, each.target->name) &&
+                isA(request, request.path, each.source->referenceClass)) {
+                traversals.push_back(each);
+            }
+        }
+    }
+    return traversals;
+}
+
+/** Calls `take(session, traversal, pairs)` with the pairs at the request's path, in one session. */
+template <class Take>
+void traverse(const Request& request, const AssociationFilter& filter, Take take) {
+    if (keyCountOf(request.path) == 0) {
+        fail(CMPI_RC_ERR_INVALID_PARAMETER, "Associations begin at an instance: the path needs its keys.");
+    }
+    const std::vector<Traversal> traversals = traversalsFrom(request, filter);
+    if (traversals.empty()) {
+        return;
+    }
+    ProviderSession session(request);
+    const std::vector<Computer> computers = knownComputers(request, session);
+    for (const Traversal& traversal : traversals) {
+        Pairs pairs = pairsOf(session, computers, *traversal.association);
+        const auto isElsewhere = [&](const auto& pair) {
+            return !samePath(pathAt(*traversal.source, pair), request.path);
+        };
+        pairs.erase(std::remove_if(pairs.begin(), pairs.end(), isElsewhere), pairs.end());
+        take(session, traversal, pairs);
+    }
+}
+
+/** Removes the answers that are not of the result class. */
+template <class Answer, class PathOf>
+void restrict(const Request& request, const char* resultClass, std::vector<Answer>& answers, PathOf pathOfAnswer) {
+    const auto isOther = [&](Answer answer) {
+        return !isAny(resultClass) && !isA(request, pathOfAnswer(answer), resultClass);
+    };
+    answers.erase(std::remove_if(answers.begin(), answers.end(), isOther), answers.end());
+}
+
+const CMPIObjectPath* associationPath(const Request& request, const Class& association, const AssociationPair& pair) {
+    CMPIObjectPath* path = makePath(request.broker(), nameSpaceOf(request.path), association.name);
+    for (const Property& end : association) {
+        addReference(path, end.name, pathAt(end, pair));
+    }
+    return path;
+}
+
+/** The instance of an association. Both of its properties are keys, so a property list does not restrict it. */
+const CMPIInstance* associationInstance(const Request& request, const Class& association, const AssociationPair& pair) {
+    CMPIInstance* instance = makeInstance(request.broker(), associationPath(request, association, pair));
+    for (const Property& end : association) {
+        setReference(instance, end.name, pathAt(end, pair));
+    }
+    return instance;
+}
+
+/** Makes an answer of a pair of an association. */
+template <class Made>
+using Maker = const Made* (*)(const Request&, const Class&, const AssociationPair&);
+
+/** Makes an answer of each pair of an association. */
+template <class Made>
+std::vector<const Made*> allOf(const Request& request, const Class& association, Maker<Made> make) {
+    ProviderSession session(request);
+    std::vector<const Made*> answers;
+    for (const AssociationPair& pair : pairsOf(session, knownComputers(request, session), association)) {
+        answers.push_back(make(request, association, pair));
+    }
+    return answers;
+}
+
+/** Makes an answer of each association at the request's path. */
+template <class Made>
+void giveReferences(const Request& request, const char* associationClass, const char* role, Maker<Made> make) {
+    std::vector<const Made*> answers;
+    traverse(request, {associationClass, role, nullptr},
+             [&](const ProviderSession&, const Traversal& traversal, const Pairs& pairs) {
+                 for (const AssociationPair& pair : pairs) {
+                     answers.push_back(make(request, *traversal.association, pair));
+                 }
+             });
+    request.giveAll(answers);
+}
+
+const CMPIInstance* associationAt(const Request& request, const Class& association) {
+    ProviderSession session(request);
+    for (const Property& end : association) {
+        if (referenceOf(request.path, end.name) == nullptr) {
+            fail(CMPI_RC_ERR_INVALID_PARAMETER,
+                 std::string("The path of a ") + association.name + " needs the key " + end.name + " as a reference.");
+        }
+    }
+    for (const AssociationPair& pair : pairsOf(session, knownComputers(request, session), association)) {
+        if (samePath(associationPath(request, association, pair), request.path)) {
+            return associationInstance(request, association, pair);
+        }
+    }
+    fail(CMPI_RC_ERR_NOT_FOUND, std::string("There is no such ") + association.name + ".");
+}
+
+}  // namespace
+
+void associators(const Request& request, const char* associationClass, const char* resultClass, const char* role,
+                 const char* resultRole, const char** properties) {
+    std::vector<const CMPIInstance*> answers;
+    traverse(request, {associationClass, role, resultRole},
+             [&](const ProviderSession& session, const Traversal& traversal, const Pairs& pairs) {
+                 const Class& owner = *findClass(traversal.target->referenceClass);
+                 const PropertyList list(properties, owner);
+                 for (const AssociationPair& pair : pairs) {
+                     const CMPIInstance* instance = isComputerEnd(*traversal.target)
+                                                        ? pair.computer.instance
+                                                        : session.find(localPath(pair.element, owner), owner);
+                     if (instance != nullptr) {
+                         answers.push_back(list.applied(request.broker(), instance));
+                     }
+                 }
+             });
+    restrict(request, resultClass, answers, pathOf);
+    request.giveAll(answers);
+}
+
+void associatorNames(const Request& request, const char* associationClass, const char* resultClass, const char* role,
+                     const char* resultRole) {
+    std::vector<const CMPIObjectPath*> answers;
+    traverse(request, {associationClass, role, resultRole},
+             [&](const ProviderSession&, const Traversal& traversal, const Pairs& pairs) {
+                 for (const AssociationPair& pair : pairs) {
+                     answers.push_back(pathAt(*traversal.target, pair));
+                 }
+             });
+    restrict(request, resultClass, answers, [](const CMPIObjectPath* path) { return path; });
+    request.giveAll(answers);
+}
+
+void references(const Request& request, const char* associationClass, const char* role, const char**) {
+    giveReferences(request, associationClass, role, associationInstance);
+}
+
+void referenceNames(const Request& request, const char* associationClass, const char* role) {
+    giveReferences(request, associationClass, role, associationPath);
+}
+
+void enumerateAssociations(const Request& request, const Class& association) {
+    request.giveAll(allOf(request, association, associationInstance));
+}
+
+void enumerateAssociationNames(const Request& request, const Class& association) {
+    request.giveAll(allOf(request, association, associationPath));
+}
+
+void getAssociation(const Request& request, const Class& association) {
+    request.give(associationAt(request, association));
+    request.finish();
+}
+
+}  // namespace gate

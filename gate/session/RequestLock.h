@@ -1,0 +1,177 @@
+#pragma once
+
+#include "gate/cmpi/Failure.h"
+
+#include <sys/types.h>
+
+#include <atomic>
+#include <chrono>
+#include <condition_variable>
+#include <cstddef>
+#include <functional>
+#include <mutex>
+
+namespace gate {
+
+/**
+ * Admits one thread to the provider, in order of arrival, and waits for requests at shutdown.
+ *
+ * A request begins, may acquire and release the lock several times, and ends. The lock belongs to no thread: while a
+ * request has released it to wait for the object manager, another request on the same thread may acquire it.
+ *
+ * A lock that is closing admits no new request, and serves those that hold it, wait for it or reacquire it. Once it is
+ * closed, no thread holds it; a request that reacquires it fails, or waits until it is opened again.
+ *
+ * It is never destroyed, so that a late request can use it.
+ */
+class RequestLock {
+public:
+    enum class Closing { temporary, permanent };
+
+    constexpr RequestLock() = default;
+    RequestLock(const RequestLock&) = delete;
+    RequestLock& operator=(const RequestLock&) = delete;
+
+    /** Whether the request is admitted. If so, it has to call endRequest(). */
+    bool beginRequest() noexcept;
+    void endRequest() noexcept;
+
+    /** Waits for the lock, behind all earlier callers. False, without the lock, if it is closing. */
+    bool acquire() noexcept;
+    /** Passes the lock to the longest waiter. */
+    void release() noexcept;
+    /** Acquires the lock after an intermediate release(). If the lock is closed, waits until it is opened. */
+    void reacquire() noexcept;
+    /** The same, but false, without the lock, if it has been closed since that generation. */
+    bool reacquire(std::size_t itsGeneration) noexcept;
+
+    /** How often the lock has been closed. A request of an earlier generation has lost its object manager. */
+    std::size_t generation() const noexcept { return timesClosed; }
+
+    /**
+     * Closes the lock when no other thread holds it or waits for it. Waits for the requests of other threads to end,
+     * but no longer than the timeout, since they may wait for a thread that never answers.
+     * Does nothing in a child process: the requests are in its parent.
+     * @param atEnd called just before the lock is closed, while no other thread holds it; must not throw
+     * @return whether this call has closed the lock
+     */
+    bool close(std::chrono::milliseconds drainTimeout, Closing closing = Closing::temporary,
+               const std::function<void()>& atEnd = nullptr) noexcept;
+
+    /** Opens a closed lock. @return whether it is open now: it is not while closing, or if closed permanently */
+    bool open() noexcept;
+
+    /** Whether requests of other threads have not ended. */
+    bool hasOtherRequests() const noexcept;
+
+    /** The number of threads that wait for the lock. */
+    std::size_t waiting() const noexcept;
+    /** The number of threads that wait in close(). */
+    std::size_t closing() const noexcept;
+
+private:
+    enum class State { open, closing, closed };
+    enum class IfClosed { fail, wait };
+    struct Waiter;
+
+    /** The waiting threads, in order. Each waiter is on the stack of its thread. */
+    struct Queue {
+        Waiter* first = nullptr;
+        Waiter* last = nullptr;
+        std::size_t length = 0;
+    };
+
+    bool waitForLock(std::unique_lock<std::mutex>& lock, IfClosed ifClosed);
+    void enqueue(Waiter& waiter);
+    void refuseWaiters();
+    void admitNext();
+    bool isFreeForCaller() const;
+    void finishClosing(std::unique_lock<std::mutex>& lock, const std::function<void()>& atEnd);
+    void notifyClosers();
+
+    mutable std::mutex mutex{};
+    std::atomic<State> state{State::open};  ///< changed with the mutex locked
+    std::atomic<std::size_t> timesClosed{0};
+    bool isPermanent = false;
+    bool isHeld = false;
+    std::size_t requests = 0;
+    std::atomic<pid_t> process{0};  ///< of the latest request
+    Queue queue{};
+    Waiter* closers = nullptr;  ///< the threads that wait in close()
+};
+
+/** The lock of the provider, of which a process has one. */
+extern RequestLock theRequestLock;
+
+/** Counts a request as active, from before its first call of the broker until after its last one. */
+class ActiveRequest {
+public:
+    ActiveRequest() noexcept : isAdmitted(theRequestLock.beginRequest()) {}
+    ~ActiveRequest() {
+        if (isAdmitted) {
+            theRequestLock.endRequest();
+        }
+    }
+    ActiveRequest(const ActiveRequest&) = delete;
+    ActiveRequest& operator=(const ActiveRequest&) = delete;
+
+    const bool isAdmitted;
+    const std::size_t generation = theRequestLock.generation();
+};
+
+/** Disables the cancellation of the calling thread, which would end the process or leave a file incomplete. */
+class CancellationDisabled {
+public:
+    CancellationDisabled() noexcept;
+    ~CancellationDisabled();
+    CancellationDisabled(const CancellationDisabled&) = delete;
+    CancellationDisabled& operator=(const CancellationDisabled&) = delete;
+
+private:
+    int before = 0;
+};
+
+/** Holds the lock. The constructor throws ManagerGone if the lock is closing. */
+class LockGuard {
+public:
+    LockGuard() : isHeld(theRequestLock.acquire()) { requireHeld(); }
+    ~LockGuard() {
+        if (isHeld) {
+            theRequestLock.release();
+        }
+    }
+    LockGuard(const LockGuard&) = delete;
+    LockGuard& operator=(const LockGuard&) = delete;
+
+    /** Releases the lock for some work. Throws ManagerGone, without the lock, if it was closed meanwhile. */
+    template <class Work>
+    void releaseFor(Work work) {
+        theRequestLock.release();
+        isHeld = false;
+        try {
+            work();
+        } catch (...) {
+            reacquire();
+            throw;
+        }
+        reacquire();
+    }
+
+private:
+    void reacquire() {
+        isHeld = theRequestLock.reacquire(generation);
+        requireHeld();
+    }
+
+    void requireHeld() const {
+        if (!isHeld) {
+            throw ManagerGone{};
+        }
+    }
+
+    CancellationDisabled cancellationDisabled;
+    bool isHeld;
+    const std::size_t generation = theRequestLock.generation();  ///< cannot change while the lock is held
+};
+
+}  // namespace gate

@@ -1,0 +1,175 @@
+#include "Differences.h"
+
+#include <algorithm>
+#include <string_view>
+
+namespace gate {
+
+namespace {
+
+/** The clock, of which a client always sends back an old value. */
+bool isClock(const Property& property) {
+    return sameName(property.name, "LocalDateTime");
+}
+
+/** Whether the provider copies the value from the preceding property where none is sent. */
+bool isPersonalized(const Property& property) {
+    constexpr std::string_view prefix = "Personalized";
+    return sameName(std::string_view(property.name).substr(0, prefix.size()), prefix);
+}
+
+bool isDate(const Property& property) {
+    return property.type == CMPI_dateTime;
+}
+
+bool isAmong(const Property& property, const Values& values) {
+    return std::any_of(values.begin(), values.end(), [&](const auto& value) { return value.first == &property; });
+}
+
+/** The value in the data file. The provider returns "Null" for a personalized value that is empty there. */
+std::string storedValue(const Property& property, const std::string& returned) {
+    return isPersonalized(property) && returned == "Null" ? std::string() : returned;
+}
+
+/** The value in a record file of a property that is null. */
+std::string storedNull(const Property& property) {
+    return isDate(property) ? noDate : property.type == CMPI_string ? "" : "0";
+}
+
+/** The datetime with the offset "-000", if it is zero: "+000" is equal. */
+std::string normalized(const std::string& dateTime) {
+    constexpr std::string_view zero = "+000";
+    const std::size_t offset = std::string_view(noDate).size() - zero.size();
+    const bool hasPlus = dateTime.size() == offset + zero.size() && dateTime.compare(offset, zero.size(), zero) == 0;
+    return hasPlus ? dateTime.substr(0, offset) + "-000" : dateTime;
+}
+
+/** The value as object managers pass it on: without blanks at its ends, some also without non-ASCII letters there. */
+std::string_view trimmed(std::string_view value, bool alsoNonAscii) {
+    const auto stays = [&](unsigned char each) { return each > ' ' && !(alsoNonAscii && each > 0x7F); };
+    const auto* begin = std::find_if(value.begin(), value.end(), stays);
+    const auto end = std::find_if(value.rbegin(), std::string_view::reverse_iterator(begin), stays).base();
+    return value.substr(static_cast<std::size_t>(begin - value.begin()), static_cast<std::size_t>(end - begin));
+}
+
+/**
+ * Whether a given value is the current one, as the client has read it and the object manager has passed it on. A value
+ * that is writable and listed may differ from it by a non-ASCII letter at its end: that is a change.
+ */
+bool isCurrent(const Property& property, const CMPIInstance* current, const std::string& given, bool isListed) {
+    const auto value = propertyOf(current, property);
+    if (isDate(property)) {
+        return normalized(value.value_or(noDate)) == normalized(given);
+    }
+    if (!value) {
+        return !property.isWritable && property.type == CMPI_string && given.empty();
+    }
+    if (storedValue(property, *value) == storedValue(property, given)) {
+        return true;
+    }
+    const bool mayLackLetters = !property.isWritable || !isListed;
+    return property.type == CMPI_string &&
+           (trimmed(*value, false) == given || (mayLackLetters && trimmed(*value, true) == given));
+}
+
+}  // namespace
+
+Values diff(const CMPIInstance* current, const Values& given, bool areListed) {
+    Values changes;
+    for (const auto& [property, value] : given) {
+        if (isClock(*property) || isCurrent(*property, current, value, areListed)) {
+            continue;
+        }
+        if (!property->isWritable) {
+            fail(CMPI_RC_ERR_INVALID_PARAMETER,
+                 std::string(property->name) + " is read-only. Omit it, or send it back unchanged.");
+        }
+        const bool isNoDate = isDate(*property) && normalized(value) == noDate;
+        changes.emplace_back(property, isNoDate ? noDate : value);
+    }
+    return changes;
+}
+
+Values valuesToSend(const Class& owner, const CMPIInstance* current, const Values& changes) {
+    Values values = changes;
+    for (const Property& property : owner) {
+        if (!isPersonalized(property) || isAmong(property, changes)) {
+            continue;
+        }
+        const auto value = propertyOf(current, property);
+        if (!value) {
+            // These properties are never null, unless the provider could not read the file.
+            fail(CMPI_RC_ERR_FAILED, std::string(property.name) + " cannot be read, so nothing is changed.");
+        }
+        values.emplace_back(&property, storedValue(property, *value));
+    }
+    return values;
+}
+
+Values rollbackValues(const Class& owner, const DataFile& file, const Values& changes, const CMPIInstance* current) {
+    Values values;
+    for (const Property& property : owner) {
+        const auto value = propertyOf(current, property);
+        if (isAmong(property, changes) || (!file.hasRecords() && value && !property.isKey)) {
+            values.emplace_back(&property, storedValue(property, value.value_or(noDate)));
+        }
+    }
+    return values;
+}
+
+bool equalOn(const Values& properties, const CMPIInstance* left, const CMPIInstance* right) {
+    return std::all_of(properties.begin(), properties.end(), [&](const auto& value) {
+        return isClock(*value.first) || propertyOf(left, *value.first) == propertyOf(right, *value.first);
+    });
+}
+
+bool altersFile(const DataFile& file, const CMPIInstance* current, const Values& changes) {
+    return std::any_of(changes.begin(), changes.end(), [&](const auto& change) {
+        const auto& [property, value] = change;
+        const std::string before = propertyOf(current, *property).value_or(storedNull(*property));
+        return before != value && survivesRoundTrip(file, *property, before) &&
+               survivesRoundTrip(file, *property, value);
+    });
+}
+
+namespace {
+
+/** Whether the changes remove a value. Two properties may show the same one. */
+bool isRemoved(const std::string& value, const DataFile& file, const CMPIInstance* before, const Values& changes) {
+    return std::any_of(changes.begin(), changes.end(), [&](const auto& change) {
+        const bool isNullDate = isDate(*change.first) && !isRepresentable(file, change.second);
+        return (change.second.empty() || isNullDate) && propertyOf(before, *change.first) == value;
+    });
+}
+
+void requireNothingLost(const Class& owner, const DataFile& file, const CMPIInstance* before, const CMPIInstance* after,
+                        const Values& changes) {
+    for (const Property& property : owner) {
+        const std::string value = propertyOf(before, property).value_or(std::string());
+        const std::string now = propertyOf(after, property).value_or(std::string());
+        const bool isLost = storedValue(property, now).empty() && !storedValue(property, value).empty();
+        if (isLost && !isAmong(property, changes) && !isRemoved(value, file, before, changes)) {
+            fail(CMPI_RC_ERR_FAILED, std::string(property.name) + " was lost: the data file could not be read.");
+        }
+    }
+}
+
+}  // namespace
+
+void requireChanged(const Class& owner, const DataFile& file, const CMPIInstance* before, const CMPIInstance* after,
+                    const Values& changes) {
+    requireNothingLost(owner, file, before, after, changes);
+    for (const auto& [property, value] : changes) {
+        const auto now = propertyOf(after, *property);
+        const bool isEqual = now && (isDate(*property) ? normalized(*now) == normalized(value) : *now == value);
+        const bool isNull = !now && isDate(*property) && !isRepresentable(file, value);
+        // The provider may return a word for an empty value: it suffices that it is not the former value.
+        const bool isEmptied = value.empty() && now != propertyOf(before, *property);
+        if (!isEqual && !isNull && !isEmptied) {
+            fail(CMPI_RC_ERR_FAILED,
+                 std::string(property->name) + " could not be stored; see the agent's log at level 3000.");
+        }
+    }
+}
+
+}  // namespace gate

@@ -1,0 +1,327 @@
+#include "Diary.h"
+#include "gate/session/ProviderSession.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <atomic>
+#include <chrono>
+#include <functional>
+#include <string>
+#include <thread>
+#include <vector>
+
+// The request lock while it closes, when it is closed, and when it is opened again.
+
+namespace gatetest {
+namespace {
+
+using gate::RequestLock;
+using testing::ElementsAre;
+
+/** Waits until the lock is closing or closed. */
+void awaitClosing(RequestLock& lock) {
+    while (lock.beginRequest()) {
+        lock.endRequest();
+        std::this_thread::yield();
+    }
+}
+
+TEST(LockClosingTest, AClosedLockAdmitsNoRequest) {
+    RequestLock lock;
+    EXPECT_TRUE(lock.beginRequest());
+    lock.endRequest();
+    EXPECT_TRUE(lock.close(longEnough));
+    EXPECT_FALSE(lock.beginRequest());
+    EXPECT_FALSE(lock.close(longEnough)) << "it was closed already";
+}
+
+TEST(LockClosingTest, ClosingWaitsForTheHolderAndTheQueue) {
+    RequestLock lock;
+    Diary diary;
+    std::vector<std::thread> threads;
+    const auto request = [&](const std::string& name) {
+        lock.beginRequest();
+        ASSERT_TRUE(lock.acquire());
+        diary.note(name + " inside");
+        if (name == "first") {
+            diary.await("go on");
+        }
+        diary.note(name + " done");
+        lock.release();
+        lock.endRequest();
+    };
+    threads.emplace_back(request, "first");
+    diary.await("first inside");
+    threads.emplace_back(request, "second");
+    awaitQueue(lock, 1);
+    threads.emplace_back([&] {
+        lock.close(longEnough);
+        diary.note("closed");
+    });
+    awaitClosing(lock);
+    EXPECT_THAT(diary.all(), ElementsAre("first inside"));
+    diary.note("go on");
+    join(threads);
+    EXPECT_THAT(diary.all(),
+                ElementsAre("first inside", "go on", "first done", "second inside", "second done", "closed"));
+}
+
+TEST(LockClosingTest, AfterTheTimeoutClosingWaitsForTheHolderOnly) {
+    RequestLock lock;
+    Diary diary;
+    lock.beginRequest();
+    ASSERT_TRUE(lock.acquire());
+    std::thread closer([&] {
+        lock.close(std::chrono::seconds(0));
+        diary.note("closed");
+    });
+    awaitClosing(lock);
+    diary.note("releasing");
+    lock.release();
+    closer.join();
+    EXPECT_THAT(diary.all(), ElementsAre("releasing", "closed")) << "before it departs";
+    lock.endRequest();
+}
+
+TEST(LockClosingTest, AClosingLockCannotBeAcquired) {
+    RequestLock lock;
+    ASSERT_TRUE(lock.beginRequest());
+    std::thread closer([&] { EXPECT_TRUE(lock.close(longEnough)); });
+    awaitClosing(lock);
+    EXPECT_FALSE(lock.acquire());
+    lock.endRequest();
+    closer.join();
+}
+
+TEST(LockClosingTest, AClosingLockCanBeReacquired) {
+    RequestLock lock;
+    ASSERT_TRUE(lock.beginRequest());
+    ASSERT_TRUE(lock.acquire());
+    lock.release();
+    std::thread closer([&] { EXPECT_TRUE(lock.close(longEnough)); });
+    awaitClosing(lock);
+    lock.reacquire();
+    lock.release();
+    lock.endRequest();
+    closer.join();
+}
+
+TEST(LockClosingTest, ReacquiringAClosedLockWaitsUntilItIsOpened) {
+    RequestLock lock;
+    Diary diary;
+    std::thread late([&] {
+        lock.beginRequest();
+        EXPECT_TRUE(lock.acquire());
+        lock.release();
+        diary.note("released");
+        diary.await("shut");
+        lock.reacquire();
+        diary.note("again");
+        lock.release();
+        lock.endRequest();
+    });
+    diary.await("released");
+    EXPECT_TRUE(lock.close(std::chrono::seconds(0)));
+    diary.note("shut");
+    awaitQueue(lock, 1);
+    diary.note("opened");
+    lock.open();
+    late.join();
+    EXPECT_THAT(diary.all(), ElementsAre("released", "shut", "opened", "again"));
+    EXPECT_TRUE(lock.beginRequest());
+    lock.endRequest();
+}
+
+TEST(LockClosingTest, ReacquiringInAGenerationFailsOnceTheLockHasBeenClosed) {
+    RequestLock lock;
+    ASSERT_TRUE(lock.beginRequest());
+    ASSERT_TRUE(lock.acquire());
+    lock.release();
+    const std::size_t generation = lock.generation();
+    EXPECT_TRUE(lock.reacquire(generation));
+    lock.release();
+    lock.endRequest();
+    EXPECT_TRUE(lock.close(longEnough));
+    EXPECT_FALSE(lock.reacquire(generation));
+    EXPECT_TRUE(lock.open());
+    EXPECT_NE(lock.generation(), generation);
+    EXPECT_FALSE(lock.reacquire(generation)) << "its object manager has ended";
+    EXPECT_TRUE(lock.acquire()) << "the failed call does not hold it";
+    lock.release();
+}
+
+TEST(LockClosingTest, ClosingRefusesWaitersOfAGenerationAndKeepsTheOthers) {
+    RequestLock lock;
+    Diary diary;
+    std::vector<std::thread> threads;
+    const auto request = [&](const std::string& name, const std::function<bool()>& reacquire) {
+        lock.beginRequest();
+        EXPECT_TRUE(lock.acquire());
+        lock.release();
+        diary.note(name + " released");
+        diary.await("ending");
+        diary.note(name + (reacquire() ? " again" : " refused"));
+        lock.endRequest();
+    };
+    threads.emplace_back(request, "first", [&] { return lock.reacquire(0); });
+    threads.emplace_back(request, "second", [&] {
+        lock.reacquire();
+        lock.release();
+        return true;
+    });
+    diary.await("first released");
+    diary.await("second released");
+    EXPECT_TRUE(lock.close(std::chrono::seconds(0), RequestLock::Closing::temporary, [&] {
+        diary.note("ending");
+        awaitQueue(lock, 2);
+    }));
+    diary.await("first refused");
+    EXPECT_EQ(lock.waiting(), 1U);
+    diary.note("opened");
+    EXPECT_TRUE(lock.open());
+    join(threads);
+    EXPECT_EQ(diary.all().back(), "second again");
+}
+
+TEST(LockClosingTest, TheEndIsCalledBeforeTheLockIsClosedWhileNoOtherThreadHoldsIt) {
+    RequestLock lock;
+    Diary diary;
+    std::thread released([&] {
+        lock.beginRequest();
+        EXPECT_TRUE(lock.acquire());
+        lock.release();
+        diary.note("released");
+        diary.await("ending");
+        lock.reacquire();
+        diary.note("again");
+        lock.release();
+        lock.endRequest();
+    });
+    diary.await("released");
+    EXPECT_TRUE(lock.close(std::chrono::seconds(0), RequestLock::Closing::temporary, [&] {
+        diary.note("ending");
+        awaitQueue(lock, 1);
+        EXPECT_FALSE(lock.open()) << "it closes";
+        EXPECT_FALSE(lock.acquire());
+        diary.note("ended");
+    }));
+    diary.note("opened");
+    EXPECT_TRUE(lock.open());
+    released.join();
+    EXPECT_THAT(diary.all(), ElementsAre("released", "ending", "ended", "opened", "again"));
+}
+
+TEST(LockClosingTest, AWaitingCloserDoesNotCloseALockThatWasOpenedMeanwhile) {
+    RequestLock lock;
+    ASSERT_TRUE(lock.beginRequest());
+    std::atomic<int> ends{0};
+    std::vector<std::thread> threads;
+    for (int number = 0; number < 4; ++number) {
+        threads.emplace_back([&] { lock.close(longEnough, RequestLock::Closing::temporary, [&] { ++ends; }); });
+    }
+    while (lock.closing() < 4) {
+        std::this_thread::yield();
+    }
+    lock.endRequest();
+    while (!lock.open()) {
+        std::this_thread::yield();
+    }
+    join(threads);
+    EXPECT_EQ(ends, 1);
+    EXPECT_TRUE(lock.beginRequest());
+    lock.endRequest();
+}
+
+TEST(LockClosingTest, RequestsOfOtherThreadsAreReported) {
+    RequestLock lock;
+    EXPECT_FALSE(lock.hasOtherRequests());
+    lock.beginRequest();
+    EXPECT_FALSE(lock.hasOtherRequests()) << "on this thread";
+    std::thread([&] {
+        EXPECT_TRUE(lock.hasOtherRequests());
+        lock.beginRequest();
+    }).join();
+    EXPECT_TRUE(lock.hasOtherRequests());
+    lock.endRequest();
+}
+
+TEST(LockClosingTest, ARefusedRequestDoesNotCount) {
+    RequestLock lock;
+    EXPECT_TRUE(lock.close(longEnough));
+    std::thread([&] { EXPECT_FALSE(lock.beginRequest()); }).join();
+    EXPECT_FALSE(lock.hasOtherRequests());
+}
+
+TEST(LockClosingTest, APermanentlyClosedLockCannotBeOpened) {
+    RequestLock lock;
+    lock.close(longEnough);
+    lock.close(longEnough, RequestLock::Closing::permanent);
+    EXPECT_FALSE(lock.open());
+    EXPECT_FALSE(lock.beginRequest());
+}
+
+TEST(LockClosingTest, OneOfSeveralConcurrentCallsClosesTheLock) {
+    RequestLock lock;
+    std::atomic<int> closedBy{0};
+    ASSERT_TRUE(lock.beginRequest());
+    std::vector<std::thread> threads;
+    for (int number = 0; number < 4; ++number) {
+        threads.emplace_back([&] { closedBy += lock.close(longEnough) ? 1 : 0; });
+    }
+    awaitClosing(lock);
+    lock.endRequest();
+    join(threads);
+    EXPECT_EQ(closedBy, 1);
+}
+
+TEST(LockClosingTest, ClosingDoesNotWaitForARequestOfTheCallingThread) {
+    RequestLock lock;
+    ASSERT_TRUE(lock.beginRequest());
+    ASSERT_TRUE(lock.acquire());
+    lock.close(longEnough);
+    EXPECT_FALSE(lock.acquire());
+    lock.release();
+    lock.endRequest();
+}
+
+TEST(LockClosingTest, AForkedChildDoesNotWait) {
+    RequestLock lock;
+    Diary diary;
+    std::thread inside([&] {
+        lock.beginRequest();
+        EXPECT_TRUE(lock.acquire());
+        diary.note("inside");
+        diary.await("forked");
+        lock.release();
+        lock.endRequest();
+    });
+    diary.await("inside");
+    const pid_t child = fork();
+    if (child == 0) {
+        alarm(60);  // the only thread here would wait for one that is not
+        lock.close(longEnough);
+        _exit(7);
+    }
+    int status = 0;
+    EXPECT_EQ(waitpid(child, &status, 0), child);
+    EXPECT_TRUE(WIFEXITED(status));
+    EXPECT_EQ(WEXITSTATUS(status), 7);
+    diary.note("forked");
+    inside.join();
+}
+
+TEST(LockClosingTest, ARequestWithoutItsManagerGetsNoSessionAndReleasesTheLock) {
+    const gate::Request late{nullptr, nullptr, nullptr, gate::theRequestLock.generation() + 1};
+    EXPECT_THROW(gate::ProviderSession{late}, gate::ManagerGone);
+    const gate::Request inTime{nullptr, nullptr, nullptr, gate::theRequestLock.generation()};
+    EXPECT_THROW(gate::ProviderSession{inTime}, gate::ManagerGone) << "there is no manager";
+    const gate::LockGuard next;
+    EXPECT_EQ(gate::theRequestLock.waiting(), 0U) << "both sessions released the lock";
+}
+
+}  // namespace
+}  // namespace gatetest
