@@ -44,8 +44,8 @@ MEASURED = [
 
 # Those that are counted behind the gate, too, with the gate's function. After the floor, once, the benchmark asks the
 # provider alone and gated in turns.
-GATED = [(ENUM, "VELKO_Lease", 1000, "gate::*Entry<*enumerateInstances(*)>::call(*char const??)"),
-         (GET, "VELKO_Lease", 10, "gate::*Entry<*getInstance(*)>::call(*char const??)")]
+GATED = [(ENUM, "VELKO_Lease", 1000, "gate::*Entry<*enumerateInstances*>::call(*char const??)"),
+         (GET, "VELKO_Lease", 10, "gate::*Entry<*getInstance*>::call(*char const??)")]
 GATE_TURNS = 10
 
 # Highest ratio of provider to floor.

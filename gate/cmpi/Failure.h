@@ -22,6 +22,13 @@ struct ManagerGone {};
     throw Failure{rc, std::move(message)};
 }
 
+/** Sets the status of a function that the gate implements for others. They may pass null. */
+inline void setStatus(CMPIStatus* rc, CMPIrc code) {
+    if (rc != nullptr) {
+        *rc = {code, nullptr};
+    }
+}
+
 /**
  * A CMPI string over characters that exist elsewhere, made without a broker and without memory. Releasing and cloning
  * it have no effect. Its handle is the characters: some object managers read a message there instead of through its
@@ -34,22 +41,16 @@ public:
     CMPIString* handle() { return &string; }
 
 private:
-    static void setOk(CMPIStatus* rc) {
-        if (rc != nullptr) {
-            *rc = {CMPI_RC_OK, nullptr};
-        }
-    }
-
     static inline CMPIStringFT functions{CMPIVersion200,
                                          [](CMPIString*) {
                                              return CMPIStatus{CMPI_RC_OK, nullptr};
                                          },
                                          [](const CMPIString* string, CMPIStatus* rc) {
-                                             setOk(rc);
+                                             setStatus(rc, CMPI_RC_OK);
                                              return const_cast<CMPIString*>(string);
                                          },
                                          [](const CMPIString* string, CMPIStatus* rc) {
-                                             setOk(rc);
+                                             setStatus(rc, CMPI_RC_OK);
                                              return static_cast<const char*>(string->hdl);
                                          }};
 

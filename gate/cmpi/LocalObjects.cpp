@@ -6,118 +6,98 @@ namespace gate {
 
 namespace {
 
-constexpr CMPIData noData{CMPI_null, CMPI_notFound | CMPI_nullValue, {}};
-
-void setStatus(CMPIStatus* rc, CMPIrc code) {
-    if (rc != nullptr) {
-        *rc = {code, nullptr};
-    }
-}
-
-LocalMembers::iterator find(LocalMembers& members, const char* name) {
-    return std::find_if(members.begin(), members.end(),
-                        [&](const LocalMember& member) { return sameName(member.name.get(), name); });
-}
-
-/** The data of a member or, with that code, of none. */
-CMPIData dataAt(LocalMembers& members, LocalMembers::iterator member, CMPIValueState state, CMPIStatus* rc,
-                CMPIrc codeForNone) {
-    const bool isFound = member != members.end();
-    setStatus(rc, isFound ? CMPI_RC_OK : codeForNone);
-    return isFound ? member->data(state) : noData;
-}
-
-void add(LocalMembers& members, const Values& values) {
-    for (const auto& [property, value] : values) {
-        const CMPIType type = property->type == CMPI_dateTime ? CMPIType{CMPI_string} : property->type;
-        members.emplace_back(property->name, type, value);
-    }
+template <class Local, class Object>
+Local& localOf(const Object* object) {
+    return *static_cast<Local*>(object->hdl);
 }
 
 }  // namespace
 
-CMPIData LocalMember::data(CMPIValueState state) {
-    CMPIData data{type, state, {}};
-    if (type == CMPI_string) {
-        data.value.string = value.handle();
+LocalMembers::Member::Member(const Property& itsProperty, std::string itsValue)
+    : property(itsProperty), name(itsProperty.name), characters(std::move(itsValue)), value(characters.c_str()) {}
+
+LocalMembers::LocalMembers(const Values& values, CMPIrc itsNotFound, CMPIValueState itsState)
+    : notFound(itsNotFound), state(itsState) {
+    for (const auto& [property, value] : values) {
+        members.emplace_back(*property, value);
+    }
+}
+
+CMPIData LocalMembers::find(const char* name, CMPIStatus* rc) {
+    const auto found = std::find_if(members.begin(), members.end(),
+                                    [&](const Member& member) { return sameName(member.property.name, name); });
+    return dataOf(found == members.end() ? nullptr : &*found, rc);
+}
+
+CMPIData LocalMembers::at(CMPICount index, CMPIString** name, CMPIStatus* rc) {
+    Member* member = index < members.size() ? &members[index] : nullptr;
+    if (name != nullptr && member != nullptr) {
+        *name = member->name.handle();
+    }
+    return dataOf(member, rc);
+}
+
+CMPIData LocalMembers::dataOf(Member* member, CMPIStatus* rc) const {
+    setStatus(rc, member == nullptr ? notFound : CMPI_RC_OK);
+    if (member == nullptr) {
+        return {CMPI_null, CMPI_notFound | CMPI_nullValue, {}};
+    }
+    const CMPIType type = member->property.type;
+    CMPIData data{type == CMPI_dateTime ? CMPIType{CMPI_string} : type, state, {}};
+    if (data.type == CMPI_string) {
+        data.value.string = member->value.handle();
     } else {
-        data.value = scalarFrom(value.get(), type);
+        data.value = scalarFrom(member->characters, type);
     }
     return data;
 }
 
-struct LocalObjectPath::Functions {
-    static LocalObjectPath& of(const CMPIObjectPath* path) { return *static_cast<LocalObjectPath*>(path->hdl); }
-
-    template <LocalString LocalObjectPath::*part>
-    static CMPIString* get(const CMPIObjectPath* path, CMPIStatus* rc) {
-        setStatus(rc, CMPI_RC_OK);
-        return (of(path).*part).handle();
-    }
-
-    static CMPIData getKey(const CMPIObjectPath* path, const char* name, CMPIStatus* rc) {
-        LocalMembers& keys = of(path).keys;
-        return dataAt(keys, find(keys, name), CMPI_keyValue, rc, CMPI_RC_ERR_NOT_FOUND);
-    }
-
-    static CMPIData getKeyAt(const CMPIObjectPath* path, CMPICount index, CMPIString** name, CMPIStatus* rc) {
-        LocalMembers& keys = of(path).keys;
-        const auto key = index < keys.size() ? keys.begin() + index : keys.end();
-        if (name != nullptr && key != keys.end()) {
-            *name = key->name.handle();
-        }
-        return dataAt(keys, key, CMPI_keyValue, rc, CMPI_RC_ERR_NOT_FOUND);
-    }
-
-    static CMPICount getKeyCount(const CMPIObjectPath* path, CMPIStatus* rc) {
-        setStatus(rc, CMPI_RC_OK);
-        return static_cast<CMPICount>(of(path).keys.size());
-    }
-
-    static CMPIObjectPathFT makeTable() {
-        CMPIObjectPathFT table{};
-        table.ftVersion = CMPIVersion200;
-        table.getNameSpace = &get<&LocalObjectPath::nameSpace>;
-        table.getClassName = &get<&LocalObjectPath::className>;
-        table.getKey = &getKey;
-        table.getKeyAt = &getKeyAt;
-        table.getKeyCount = &getKeyCount;
-        return table;
-    }
-
-    static inline CMPIObjectPathFT table = makeTable();
-};
-
 LocalObjectPath::LocalObjectPath(std::string itsNameSpace, const Class& itsClass, const Values& itsKeys)
-    : nameSpace(std::move(itsNameSpace)), className(itsClass.name), path{this, &Functions::table} {
-    add(keys, itsKeys);
+    : nameSpaceCharacters(std::move(itsNameSpace)),
+      nameSpace(nameSpaceCharacters.c_str()),
+      className(itsClass.name),
+      keys(itsKeys, CMPI_RC_ERR_NOT_FOUND, CMPI_keyValue),
+      path{this, &functions} {}
+
+CMPIObjectPathFT LocalObjectPath::makeFunctions() {
+    CMPIObjectPathFT table{};
+    table.ftVersion = CMPIVersion200;
+    table.getNameSpace = [](const CMPIObjectPath* self, CMPIStatus* rc) {
+        setStatus(rc, CMPI_RC_OK);
+        return localOf<LocalObjectPath>(self).nameSpace.handle();
+    };
+    table.getClassName = [](const CMPIObjectPath* self, CMPIStatus* rc) {
+        setStatus(rc, CMPI_RC_OK);
+        return localOf<LocalObjectPath>(self).className.handle();
+    };
+    table.getKey = [](const CMPIObjectPath* self, const char* name, CMPIStatus* rc) {
+        return localOf<LocalObjectPath>(self).keys.find(name, rc);
+    };
+    table.getKeyAt = [](const CMPIObjectPath* self, CMPICount index, CMPIString** name, CMPIStatus* rc) {
+        return localOf<LocalObjectPath>(self).keys.at(index, name, rc);
+    };
+    table.getKeyCount = [](const CMPIObjectPath* self, CMPIStatus* rc) {
+        setStatus(rc, CMPI_RC_OK);
+        return localOf<LocalObjectPath>(self).keys.count();
+    };
+    return table;
 }
 
-std::string LocalObjectPath::key(const char* name) const {
-    const auto found = std::find_if(keys.begin(), keys.end(),
-                                    [&](const LocalMember& member) { return sameName(member.name.get(), name); });
-    return found == keys.end() ? std::string() : found->value.get();
+CMPIObjectPathFT LocalObjectPath::functions = makeFunctions();
+
+LocalInstance::LocalInstance(const Values& values)
+    : properties(values, CMPI_RC_ERR_NO_SUCH_PROPERTY, CMPI_goodValue), instance{this, &functions} {}
+
+CMPIInstanceFT LocalInstance::makeFunctions() {
+    CMPIInstanceFT table{};
+    table.ftVersion = CMPIVersion200;
+    table.getProperty = [](const CMPIInstance* self, const char* name, CMPIStatus* rc) {
+        return localOf<LocalInstance>(self).properties.find(name, rc);
+    };
+    return table;
 }
 
-struct LocalInstance::Functions {
-    static CMPIData getProperty(const CMPIInstance* instance, const char* name, CMPIStatus* rc) {
-        LocalMembers& properties = static_cast<LocalInstance*>(instance->hdl)->properties;
-        return dataAt(properties, find(properties, name), CMPI_goodValue, rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);
-    }
-
-    static CMPIInstanceFT makeTable() {
-        CMPIInstanceFT table{};
-        table.ftVersion = CMPIVersion200;
-        table.getProperty = &getProperty;
-        return table;
-    }
-
-    static inline CMPIInstanceFT table = makeTable();
-};
-
-LocalInstance::LocalInstance(const Values& values) : instance{this, &Functions::table} {
-    add(properties, values);
-}
+CMPIInstanceFT LocalInstance::functions = makeFunctions();
 
 LocalObjectPath localPath(const CMPIObjectPath* path, const Class& named) {
     Values keys;

@@ -11,54 +11,50 @@
 
 namespace gate {
 
-/** A string as a CMPI object. */
-class LocalString {
+/** The keys of a path or the properties of an instance. */
+class LocalMembers {
 public:
-    explicit LocalString(std::string itsCharacters)
-        : characters(std::move(itsCharacters)), string(characters.c_str()) {}
-    LocalString(const LocalString&) = delete;
-    LocalString& operator=(const LocalString&) = delete;
+    /** @param notFound the status of a missing member */
+    LocalMembers(const Values& values, CMPIrc itsNotFound, CMPIValueState itsState);
 
-    const std::string& get() const { return characters; }
-    CMPIString* handle() { return string.handle(); }
+    CMPICount count() const { return static_cast<CMPICount>(members.size()); }
+    CMPIData find(const char* name, CMPIStatus* rc);
+    CMPIData at(CMPICount index, CMPIString** name, CMPIStatus* rc);
 
 private:
-    std::string characters;
-    StaticString string;
+    struct Member {
+        Member(const Property& itsProperty, std::string itsValue);
+
+        const Property& property;
+        StaticString name;
+        std::string characters;
+        StaticString value;  ///< over the characters
+    };
+
+    CMPIData dataOf(Member* member, CMPIStatus* rc) const;
+
+    std::deque<Member> members{};  ///< whose elements stay where they are
+    CMPIrc notFound;
+    CMPIValueState state;
 };
-
-/** A key or property. */
-struct LocalMember {
-    LocalMember(const char* itsName, CMPIType itsType, std::string itsValue)
-        : name(itsName), type(itsType), value(std::move(itsValue)) {}
-
-    CMPIData data(CMPIValueState state);
-
-    LocalString name;
-    CMPIType type;
-    LocalString value;
-};
-
-using LocalMembers = std::deque<LocalMember>;  // whose elements need not be movable
 
 /** An object path. */
 class LocalObjectPath {
 public:
-    LocalObjectPath(std::string nameSpace, const Class& itsClass, const Values& keys = {});
+    LocalObjectPath(std::string itsNameSpace, const Class& itsClass, const Values& itsKeys = {});
     LocalObjectPath(const LocalObjectPath&) = delete;
     LocalObjectPath& operator=(const LocalObjectPath&) = delete;
-
-    /** The value of a key; empty if there is none. */
-    std::string key(const char* name) const;
 
     const CMPIObjectPath* handle() const { return &path; }
 
 private:
-    struct Functions;
+    static CMPIObjectPathFT makeFunctions();
+    static CMPIObjectPathFT functions;
 
-    LocalString nameSpace;
-    LocalString className;
-    LocalMembers keys{};
+    std::string nameSpaceCharacters;
+    StaticString nameSpace;
+    StaticString className;
+    LocalMembers keys;
     CMPIObjectPath path;
 };
 
@@ -72,9 +68,10 @@ public:
     const CMPIInstance* handle() const { return &instance; }
 
 private:
-    struct Functions;
+    static CMPIInstanceFT makeFunctions();
+    static CMPIInstanceFT functions;
 
-    LocalMembers properties{};
+    LocalMembers properties;
     CMPIInstance instance;
 };
 

@@ -62,25 +62,16 @@ CMPIInstance* makeInstance(const CMPIBroker* broker, const CMPIObjectPath* path)
 
 namespace {
 
-std::optional<std::string> charactersOf(const char* characters) {
-    return characters == nullptr ? std::nullopt : std::optional<std::string>(characters);
-}
-
-/** A datetime's characters; none if the object manager passed a null pointer as the value. */
-std::optional<std::string> charactersOf(const CMPIDateTime* dateTime) {
-    return cim::charactersOf(ask<&CMPIDateTimeFT::getStringFormat>(dateTime).value);
-}
-
 /** Converts a value by its own type; none for a type that no class here has. */
 std::optional<std::string> charactersOf(const CMPIData& data) {
     const CMPIValue& value = data.value;
     switch (data.type) {
         case CMPI_chars:
-            return charactersOf(value.chars);
+            return value.chars == nullptr ? std::nullopt : std::optional<std::string>(value.chars);
         case CMPI_string:
             return cim::charactersOf(value.string);
         case CMPI_dateTime:
-            return charactersOf(value.dateTime);
+            return cim::charactersOf(ask<&CMPIDateTimeFT::getStringFormat>(value.dateTime).value);
         case CMPI_boolean:
             return value.boolean != 0 ? "true" : "false";
         case CMPI_uint8:

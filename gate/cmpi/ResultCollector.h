@@ -1,6 +1,6 @@
 #pragma once
 
-#include <cmpift.h>
+#include "Failure.h"
 
 #include <vector>
 

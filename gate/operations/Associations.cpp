@@ -261,7 +261,7 @@ void giveReferences(const Request& request, const char* associationClass, const 
                      answers.push_back(make(request, *traversal.association, pair));
                  }
              });
-    request.giveAll(answers);
+    request.give(answers);
 }
 
 const CMPIInstance* associationAt(const Request& request, const Class& association) {
@@ -299,7 +299,7 @@ void associators(const Request& request, const char* associationClass, const cha
                  }
              });
     restrict(request, resultClass, answers, pathOf);
-    request.giveAll(answers);
+    request.give(answers);
 }
 
 void associatorNames(const Request& request, const char* associationClass, const char* resultClass, const char* role,
@@ -312,7 +312,7 @@ void associatorNames(const Request& request, const char* associationClass, const
                  }
              });
     restrict(request, resultClass, answers, [](const CMPIObjectPath* path) { return path; });
-    request.giveAll(answers);
+    request.give(answers);
 }
 
 void references(const Request& request, const char* associationClass, const char* role, const char**) {
@@ -324,16 +324,15 @@ void referenceNames(const Request& request, const char* associationClass, const 
 }
 
 void enumerateAssociations(const Request& request, const Class& association) {
-    request.giveAll(allOf(request, association, associationInstance));
+    request.give(allOf(request, association, associationInstance));
 }
 
 void enumerateAssociationNames(const Request& request, const Class& association) {
-    request.giveAll(allOf(request, association, associationPath));
+    request.give(allOf(request, association, associationPath));
 }
 
 void getAssociation(const Request& request, const Class& association) {
-    request.give(associationAt(request, association));
-    request.finish();
+    request.give(std::vector{associationAt(request, association)});
 }
 
 }  // namespace gate

@@ -70,12 +70,10 @@ void createInstance(const Request& request, const CMPIInstance* instance) {
     if (session.find(path, requested) != nullptr) {
         fail(CMPI_RC_ERR_ALREADY_EXISTS, std::string(requested.name) + " " + identifier + " already exists.");
     }
-    CMPIObjectPath* answer = makePath(session.broker(), nameSpaceOf(request.path), requested.name);
-    addKey(answer, key.name, identifier);
-    Transaction(session, requested, file, path).create(given, [&] {
-        request.give(answer);
-        request.finish();
-    });
+    CMPIObjectPath* created = makePath(session.broker(), nameSpaceOf(request.path), requested.name);
+    addKey(created, key.name, identifier);
+    const std::vector<const CMPIObjectPath*> answer{created};
+    Transaction(session, requested, file, path).create(given, [&] { request.give(answer); });
 }
 
 void modifyInstance(const Request& request, const CMPIInstance* instance, const char** properties) {

@@ -32,7 +32,7 @@ void enumerateInstanceNames(const Request& request) {
     if (requested.isAssociation) {
         return enumerateAssociationNames(request, requested);
     }
-    request.giveAll(namesOf(request, requested));
+    request.give(namesOf(request, requested));
 }
 
 void enumerateInstances(const Request& request, const char** properties) {
@@ -40,7 +40,7 @@ void enumerateInstances(const Request& request, const char** properties) {
     if (requested.isAssociation) {
         return enumerateAssociations(request, requested);
     }
-    request.giveAll(instancesOf(request, requested, properties));
+    request.give(instancesOf(request, requested, properties));
 }
 
 void getInstance(const Request& request, const char** properties) {
@@ -48,8 +48,7 @@ void getInstance(const Request& request, const char** properties) {
     if (requested.isAssociation) {
         return getAssociation(request, requested);
     }
-    request.give(instanceAt(request, requested, properties));
-    request.finish();
+    request.give(std::vector{instanceAt(request, requested, properties)});
 }
 
 }  // namespace gate

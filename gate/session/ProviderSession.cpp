@@ -15,6 +15,14 @@ void callResult(const Request& request, Answer... answer) {
     require(status.rc == CMPI_RC_OK, "accept the answer", status);
 }
 
+template <auto function, class Answer>
+void giveAll(const Request& request, const std::vector<Answer>& answers) {
+    for (const Answer& answer : answers) {
+        callResult<function>(request, answer);
+    }
+    callResult<&CMPIResultFT::returnDone>(request);
+}
+
 void requireOk(const CMPIStatus& status) {
     if (status.rc != CMPI_RC_OK) {
         const std::string reason = toString(status.msg);
@@ -68,16 +76,12 @@ const Class& Request::requestedClass() const {
     return *found;
 }
 
-void Request::give(const CMPIInstance* instance) const {
-    callResult<&CMPIResultFT::returnInstance>(*this, instance);
+void Request::give(const std::vector<const CMPIInstance*>& instances) const {
+    giveAll<&CMPIResultFT::returnInstance>(*this, instances);
 }
 
-void Request::give(const CMPIObjectPath* answer) const {
-    callResult<&CMPIResultFT::returnObjectPath>(*this, answer);
-}
-
-void Request::finish() const {
-    callResult<&CMPIResultFT::returnDone>(*this);
+void Request::give(const std::vector<const CMPIObjectPath*>& paths) const {
+    giveAll<&CMPIResultFT::returnObjectPath>(*this, paths);
 }
 
 ProviderSession::ProviderSession(const Request& itsRequest) : request(itsRequest) {

@@ -33,21 +33,15 @@ struct Request {
     /** The path's class. Fails with CMPI_RC_ERR_INVALID_CLASS if the provider does not serve it. */
     const Class& requestedClass() const;
 
-    /** Returns an answer to the client. Fails if the object manager does not accept it. */
-    void give(const CMPIInstance* instance) const;
-    void give(const CMPIObjectPath* path) const;
-
-    /** Ends the answer. */
-    void finish() const;
-
-    /** Returns all answers and ends. Called when all of them exist, so that a request that fails returns none. */
-    template <class Answer>
-    void giveAll(const std::vector<Answer>& answers) const {
-        for (const Answer& answer : answers) {
-            give(answer);
-        }
-        finish();
-    }
+    /**
+     * @name Returns the answers to the client and ends
+     * Called when all answers exist, so that a request that fails returns none. Fails if the object manager does not
+     * accept one.
+     */
+    ///@{
+    void give(const std::vector<const CMPIInstance*>& instances) const;
+    void give(const std::vector<const CMPIObjectPath*>& paths) const;
+    ///@}
 };
 
 /**

@@ -36,27 +36,23 @@ std::string reasonOf(int error) {
     return std::generic_category().message(error);
 }
 
-class Descriptor {
-public:
-    explicit Descriptor(const std::string& path) : number(open(path.c_str(), O_RDWR | O_CLOEXEC | O_NONBLOCK)) {}
-    ~Descriptor() {
-        if (isOpen()) {
-            close(number);
-        }
+/** Whether the file exists. Fails if it cannot be written or is not a regular file. */
+bool existsWritable(const std::string& path) {
+    const int descriptor = open(path.c_str(), O_RDWR | O_CLOEXEC | O_NONBLOCK);
+    if (descriptor < 0 && errno != ENOENT) {
+        failToStore(path, reasonOf(errno));
     }
-    Descriptor(const Descriptor&) = delete;
-    Descriptor& operator=(const Descriptor&) = delete;
-
-    bool isOpen() const { return number >= 0; }
-
-    bool isRegular() const {
-        struct stat status {};
-        return fstat(number, &status) == 0 && S_ISREG(status.st_mode);
+    if (descriptor < 0) {
+        return false;
     }
-
-private:
-    int number;
-};
+    struct stat status {};
+    const bool isRegular = fstat(descriptor, &status) == 0 && S_ISREG(status.st_mode);
+    close(descriptor);
+    if (!isRegular) {
+        failToStore(path, "it is not a regular file");
+    }
+    return true;
+}
 
 /** Whether the file system has room for the file's growth and for a block that is partly used. */
 bool hasRoom(const std::string& directory, std::size_t growth) {
@@ -105,15 +101,9 @@ std::size_t countLines(std::string_view content, std::string_view wanted, std::s
 void DataFile::requireWritable(std::size_t growth) const {
     const std::string path = pathOf(*this);
     const std::string directory = KO::PlatformUtilities::getKelsaDataDir();
-    const Descriptor descriptor(path);
-    if (!descriptor.isOpen() && errno != ENOENT) {
-        failToStore(path, reasonOf(errno));
-    }
-    if (descriptor.isOpen() && !descriptor.isRegular()) {
-        failToStore(path, "it is not a regular file");
-    }
+    const bool exists = existsWritable(path);
     // A property file is replaced by a new one, which needs access to the directory.
-    const bool needsDirectory = !descriptor.isOpen() || !hasRecords();
+    const bool needsDirectory = !exists || !hasRecords();
     if (needsDirectory && access(directory.c_str(), W_OK | X_OK) != 0) {
         failToStore(path, "the data directory " + directory + ": " + reasonOf(errno));
     }

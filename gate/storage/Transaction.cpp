@@ -10,6 +10,12 @@ namespace {
 
 constexpr const char* identifierKey = "InstanceID";
 
+/** The identifier of a record; empty for another instance. */
+std::string recordIdentifier(const LocalObjectPath& path, const Class& owner) {
+    const Property* key = findProperty(owner, identifierKey);
+    return key == nullptr ? std::string() : keyOf(path.handle(), *key).value_or(std::string());
+}
+
 /** The most bytes that values take in a file. */
 std::size_t sizeOf(const Values& values) {
     std::size_t size = 0;
@@ -33,7 +39,11 @@ bool succeeds(RollBack rollBack) {
 
 Transaction::Transaction(ProviderSession& itsSession, const Class& itsClass, const DataFile& itsFile,
                          const LocalObjectPath& itsPath)
-    : session(itsSession), owner(itsClass), file(itsFile), path(itsPath), identifier(itsPath.key(identifierKey)) {}
+    : session(itsSession),
+      owner(itsClass),
+      file(itsFile),
+      path(itsPath),
+      identifier(recordIdentifier(itsPath, itsClass)) {}
 
 /**
  * Runs a change and its checks, after which it is committed. If one of them fails, rolls the change back and passes
