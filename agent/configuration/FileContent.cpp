@@ -1,5 +1,7 @@
 #include "configuration/FileContent.h"
 
+#include "configuration/FileDescriptor.h"
+
 #include <fcntl.h>
 #include <unistd.h>
 
@@ -44,18 +46,12 @@ FileContent readFile(const std::string& path) {
         content.error = EINVAL;
         return content;
     }
-    const int file = ::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK | O_NOCTTY);
-    if (file < 0) {
+    const FileDescriptor file(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK | O_NOCTTY));
+    if (file.get() < 0) {
         content.error = errno;
         return content;
     }
-    try {
-        content.error = readRest(file, content.text);
-    } catch (...) {
-        ::close(file);
-        throw;
-    }
-    ::close(file);
+    content.error = readRest(file.get(), content.text);
     if (content.error != 0) {
         content.text.clear();
     }

@@ -28,7 +28,7 @@ std::wstring File::Path::text() const {
 
 struct File::Implementation {
     std::wstring path;
-    OpenFile file;
+    Agent::FileDescriptor file;
 };
 
 File::File(const std::wstring& path) : implementation(std::make_unique<Implementation>()) {
@@ -40,7 +40,7 @@ void File::open(unsigned long mode) {
     implementation->file = openFile(implementation->path, mode);
 }
 void File::close() {
-    implementation->file = OpenFile();
+    implementation->file = Agent::FileDescriptor();
 }
 
 bool File::exists(const std::wstring& path) {

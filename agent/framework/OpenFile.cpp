@@ -7,10 +7,8 @@
 
 #include <fcntl.h>
 #include <sys/stat.h>
-#include <unistd.h>
 
 #include <cerrno>
-#include <utility>
 
 namespace KO {
 
@@ -33,27 +31,14 @@ int checkOrdinary(int file) {
 
 }  // namespace
 
-OpenFile::OpenFile(OpenFile&& other) noexcept : descriptor(std::exchange(other.descriptor, -1)) {}
-
-OpenFile& OpenFile::operator=(OpenFile&& other) noexcept {
-    OpenFile old(std::exchange(descriptor, std::exchange(other.descriptor, -1)));
-    return *this;
-}
-
-OpenFile::~OpenFile() {
-    if (descriptor >= 0) {
-        ::close(descriptor);
-    }
-}
-
-OpenFile openFile(const std::wstring& path, unsigned long mode) {
+Agent::FileDescriptor openFile(const std::wstring& path, unsigned long mode) {
     constexpr const char* failure = "Cannot open ";
     const std::string name = make_string(path);
     if (name.find('\0') != std::string::npos || (mode != FILE_MODE_READ && mode != FILE_MODE_WRITE)) {
         throwFileError(failure, name, EINVAL);
     }
     const int flags = everyOpening | (mode == FILE_MODE_READ ? O_RDONLY : O_RDWR | O_CREAT);
-    OpenFile file(::open(name.c_str(), flags, modeOfNewFiles));
+    Agent::FileDescriptor file(::open(name.c_str(), flags, modeOfNewFiles));
     if (file.get() < 0) {
         throwFileError(failure, name, errno);
     }

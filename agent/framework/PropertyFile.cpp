@@ -37,7 +37,7 @@ PropertyFile::PropertyFile(const File::Path& path) : implementation(std::make_un
 PropertyFile::~PropertyFile() = default;
 
 void PropertyFile::open(unsigned long mode) {
-    const OpenFile file = openFile(implementation->path, mode);
+    const Agent::FileDescriptor file = openFile(implementation->path, mode);
     std::string text;
     if (const int error = Agent::readRest(file.get(), text)) {
         throwFileError("Cannot read ", make_string(implementation->path), error);

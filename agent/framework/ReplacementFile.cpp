@@ -94,7 +94,7 @@ private:
     static mode_t withoutGroup(mode_t mode) { return (mode & 0700U) | (mode & (mode >> 3U) & 07U); }
 
     std::string path;
-    OpenFile file;
+    Agent::FileDescriptor file;
 };
 
 /** The file that a path leads to; the path itself if there is none. A link that cannot be followed is not replaced. */
@@ -110,7 +110,7 @@ std::string followLinks(const std::string& path) {
 /** Forces the renaming to the disk. It has been done either way: a failure is no failure to replace. */
 void syncDirectoryOf(const std::string& path) {
     const std::string directory = path.find('/') == std::string::npos ? "." : path.substr(0, path.rfind('/') + 1);
-    const OpenFile file(::open(directory.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
+    const Agent::FileDescriptor file(::open(directory.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
     if (file.get() >= 0) {
         ::fsync(file.get());
     }

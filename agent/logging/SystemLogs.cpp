@@ -1,9 +1,10 @@
 #include "logging/SystemLogs.h"
 
+#include "configuration/FileDescriptor.h"
+
 #include <sys/socket.h>
 #include <sys/un.h>
 #include <syslog.h>
-#include <unistd.h>
 
 #include <cerrno>
 #include <cstdio>
@@ -17,28 +18,25 @@ namespace {
 constexpr int errorLevel = 3000;
 
 /** A socket that sends datagrams to a path and never waits. */
-class Datagrams {
+class DatagramSocket {
 public:
-    explicit Datagrams(const std::string& path)
+    explicit DatagramSocket(const std::string& path)
         : descriptor(::socket(AF_UNIX, SOCK_DGRAM | SOCK_NONBLOCK | SOCK_CLOEXEC, 0)) {
-        if (descriptor < 0) {
+        if (descriptor.get() < 0) {
             throw std::system_error(errno, std::generic_category());
         }
         address.sun_family = AF_UNIX;
         path.copy(address.sun_path, sizeof address.sun_path - 1);
     }
-    ~Datagrams() { ::close(descriptor); }
-    Datagrams(const Datagrams&) = delete;
-    Datagrams& operator=(const Datagrams&) = delete;
 
     /** Not connected: so a service that was started anew is found. @return whether it was taken */
     bool send(const std::string& content) const {
-        return ::sendto(descriptor, content.data(), content.size(), MSG_NOSIGNAL | MSG_DONTWAIT,
+        return ::sendto(descriptor.get(), content.data(), content.size(), MSG_NOSIGNAL | MSG_DONTWAIT,
                         reinterpret_cast<const sockaddr*>(&address), sizeof address) >= 0;
     }
 
 private:
-    int descriptor;
+    Agent::FileDescriptor descriptor;
     sockaddr_un address{};
 };
 
@@ -59,7 +57,7 @@ using Form = std::string (*)(int priority, const std::string& line);
 class DatagramSink : public Sink {
 public:
     DatagramSink(const std::string& socketPath, Form itsForm, bool itTells)
-        : datagrams(socketPath), form(itsForm), tells(itTells) {}
+        : service(socketPath), form(itsForm), tells(itTells) {}
 
     void write(const Record& record) override {
         if (!(tellOfDropped() && send(record))) {
@@ -69,7 +67,7 @@ public:
 
 private:
     bool send(const Record& record) {
-        return datagrams.send(form(record.level <= errorLevel ? LOG_ERR : LOG_DEBUG, cut(systemLogLine(record))));
+        return service.send(form(record.level <= errorLevel ? LOG_ERR : LOG_DEBUG, cut(systemLogLine(record))));
     }
 
     /** @return whether nothing is left to tell */
@@ -85,7 +83,7 @@ private:
         return true;
     }
 
-    Datagrams datagrams;
+    DatagramSocket service;
     Form form;
     bool tells;
     unsigned long dropped = 0;

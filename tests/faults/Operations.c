@@ -229,6 +229,7 @@ INTERPOSE(operationStatus, -1, int, fstat, (int file, struct stat* status), (fil
 INTERPOSE(operationStatus, -1, int, fstat64, (int file, struct stat64* status), (file, status))
 INTERPOSE_PATH(operationStatus, -1, int, statvfs, (const char* path, struct statvfs* status), (path, status))
 INTERPOSE_PATH(operationStatus, -1, int, access, (const char* path, int mode), (path, mode))
+INTERPOSE(operationWrite, -1, int, ftruncate, (int file, off_t length), (file, length))
 INTERPOSE(operationAttributes, -1, int, fchmod, (int file, mode_t mode), (file, mode))
 INTERPOSE(operationAttributes, -1, int, fchown, (int file, uid_t owner, gid_t group), (file, owner, group))
 INTERPOSE_PATH(operationResolve, NULL, char*, realpath, (const char* path, char* resolved), (path, resolved))
