@@ -1,24 +1,45 @@
 #include "configuration/Document.h"
 
+#include "cim/Utf8.h"
 #include "configuration/FileContent.h"
 #include "configuration/Toml.h"
-#include "configuration/TomlText.h"
+#include "configuration/TomlNesting.h"
 
+#include <toml.hpp>
+
+#include <algorithm>
 #include <cstdlib>
+#include <sstream>
 
 namespace Agent {
 
 namespace {
+
+constexpr std::size_t largestDocument = 128U << 10U;  // the parser needs quadratic time for long arrays
 
 std::string invalid(const std::string& name, std::size_t line, std::string_view reason) {
     return name + " is not valid TOML (line " + std::to_string(line) + ": " + std::string(reason) +
            "); using the defaults";
 }
 
+std::size_t lineAt(std::string_view text, std::size_t position) {
+    const std::string_view before = text.substr(0, position);
+    return 1 + static_cast<std::size_t>(std::count(before.begin(), before.end(), '\n'));
+}
+
+/** The first line of the parser's message, without the name of the function that failed. */
+std::string_view reasonOf(const toml::exception& failure) {
+    std::string_view message = failure.what();
+    message = message.substr(0, message.find('\n'));
+    const std::size_t name = message.find(": ");
+    message.remove_prefix(name != std::string_view::npos ? name + 2 : 0);
+    return message.substr(0, message.find_last_not_of(" .") + 1);
+}
+
 }  // namespace
 
 struct Document::Content {
-    toml::table table;
+    TomlTable table;
 };
 
 Document::Document() : content(std::make_unique<Content>()) {}
@@ -45,15 +66,24 @@ Document Document::readDefault() {
 
 Document Document::parse(std::string_view text, const std::string& name) {
     Document document;
-    if (const std::optional<Objection> objection = objectionTo(text)) {
-        document.whatIsWrong = invalid(name, objection->line, objection->reason);
+    if (text.size() > largestDocument) {
+        document.whatIsWrong =
+            name + " is larger than " + std::to_string(largestDocument) + " bytes; using the defaults";
+        return document;
+    }
+    if (const std::size_t position = cim::findInvalidUtf8(text); position != std::string_view::npos) {
+        document.whatIsWrong = invalid(name, lineAt(text, position), "a character is not UTF-8");
+        return document;
+    }
+    if (const std::optional<std::size_t> line = lineNestedTooDeep(text)) {
+        document.whatIsWrong = invalid(name, *line, "nested too deep");
         return document;
     }
     try {
-        // The name is not for the parser: it would end the process where memory for a copy is lacking.
-        document.content->table = toml::parse(text);
-    } catch (const toml::parse_error& failure) {
-        document.whatIsWrong = invalid(name, failure.source().begin.line, failure.description());
+        std::istringstream stream{std::string(text)};
+        document.content->table = toml::parse<toml::discard_comments, std::map, std::vector>(stream).as_table();
+    } catch (const toml::exception& failure) {
+        document.whatIsWrong = invalid(name, failure.location().line(), reasonOf(failure));
     }
     return document;
 }

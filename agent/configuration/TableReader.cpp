@@ -1,6 +1,6 @@
 #include "configuration/TableReader.h"
 
-#include "configuration/Toml.h"
+#include <toml.hpp>
 
 #include <algorithm>
 
@@ -8,35 +8,44 @@ namespace Agent {
 
 namespace {
 
-const toml::table& emptyTable() {
-    static const toml::table table;
+const TomlTable& emptyTable() {
+    static const TomlTable table;
     return table;
+}
+
+bool isTable(const TomlValue& value) {
+    return value.is_table();
 }
 
 }  // namespace
 
-TableReader::TableReader(const toml::table* table, std::string name, Problems& problemList)
+TableReader::TableReader(const TomlTable* table, std::string name, Problems& problemList)
     : source(table != nullptr ? table : &emptyTable()), tableName(std::move(name)), problems(&problemList) {}
 
-bool TableReader::has(std::string_view key) {
-    knownKeys.emplace_back(key);
-    return source->contains(key);
+const TomlValue* TableReader::find(std::string_view key) {
+    const std::string& name = knownKeys.emplace_back(key);
+    const auto entry = source->find(name);
+    return entry != source->end() ? &entry->second : nullptr;
 }
 
-std::optional<std::string> TableReader::text(std::string_view key) {
-    if (!has(key)) {
+bool TableReader::has(std::string_view key) {
+    return find(key) != nullptr;
+}
+
+std::optional<std::string> TableReader::string(std::string_view key) {
+    const TomlValue* value = find(key);
+    if (value == nullptr) {
         return std::nullopt;
     }
-    const auto* value = source->get_as<std::string>(key);
-    if (value == nullptr) {
+    if (!value->is_string()) {
         reject(key, "must be a string");
         return std::nullopt;
     }
-    return value->get();
+    return value->as_string().str;
 }
 
-std::optional<std::string> TableReader::someText(std::string_view key) {
-    std::optional<std::string> value = text(key);
+std::optional<std::string> TableReader::nonEmptyString(std::string_view key) {
+    std::optional<std::string> value = string(key);
     if (value && value->empty()) {
         reject(key, "must not be empty");
         return std::nullopt;
@@ -45,63 +54,60 @@ std::optional<std::string> TableReader::someText(std::string_view key) {
 }
 
 std::optional<bool> TableReader::flag(std::string_view key) {
-    if (!has(key)) {
+    const TomlValue* value = find(key);
+    if (value == nullptr) {
         return std::nullopt;
     }
-    const auto* value = source->get_as<bool>(key);
-    if (value == nullptr) {
+    if (!value->is_boolean()) {
         reject(key, "must be true or false");
         return std::nullopt;
     }
-    return value->get();
+    return value->as_boolean();
 }
 
 std::optional<std::int64_t> TableReader::number(std::string_view key, std::int64_t minimum, std::int64_t maximum) {
-    if (!has(key)) {
+    const TomlValue* value = find(key);
+    if (value == nullptr) {
         return std::nullopt;
     }
-    const auto* value = source->get_as<std::int64_t>(key);
-    if (value == nullptr || value->get() < minimum || value->get() > maximum) {
+    if (!value->is_integer() || value->as_integer() < minimum || value->as_integer() > maximum) {
         reject(key, "must be an integer from " + std::to_string(minimum) + " to " + std::to_string(maximum));
         return std::nullopt;
     }
-    return value->get();
+    return value->as_integer();
 }
 
 TableReader TableReader::table(std::string_view key) {
-    const toml::table* value = nullptr;
-    if (has(key)) {
-        value = source->get_as<toml::table>(key);
-        if (value == nullptr) {
-            reject(key, "must be a table");
-        }
+    const TomlValue* value = find(key);
+    if (value != nullptr && !value->is_table()) {
+        reject(key, "must be a table");
+        value = nullptr;
     }
-    return TableReader(value, nameOf(key), *problems);
+    return TableReader(value != nullptr ? &value->as_table() : nullptr, nameOf(key), *problems);
 }
 
 std::vector<TableReader> TableReader::tables(std::string_view key) {
     std::vector<TableReader> readers;
-    if (!has(key)) {
+    const TomlValue* array = find(key);
+    if (array == nullptr) {
         return readers;
     }
-    const toml::array* values = source->get_as<toml::array>(key);
-    if (values == nullptr || !(values->empty() || values->is_homogeneous<toml::table>())) {
+    if (!array->is_array() || !std::all_of(array->as_array().begin(), array->as_array().end(), isTable)) {
         reject(key, "must be an array of tables");
         return readers;
     }
-    for (const toml::node& value : *values) {
+    for (const TomlValue& value : array->as_array()) {
         const std::string name = nameOf(key) + "[" + std::to_string(readers.size()) + "]";
-        readers.emplace_back(value.as_table(), name, *problems);
+        readers.emplace_back(&value.as_table(), name, *problems);
     }
     return readers;
 }
 
-std::vector<std::pair<std::string, std::string>> TableReader::allTexts() {
+std::vector<std::pair<std::string, std::string>> TableReader::allStrings() {
     std::vector<std::pair<std::string, std::string>> entries;
     for (const auto& entry : *source) {
-        const std::string key(entry.first.str());
-        if (std::optional<std::string> value = text(key)) {
-            entries.emplace_back(key, std::move(*value));
+        if (std::optional<std::string> value = string(entry.first)) {
+            entries.emplace_back(entry.first, std::move(*value));
         }
     }
     return entries;
@@ -113,8 +119,8 @@ void TableReader::reject(std::string_view key, const std::string& why) {
 
 void TableReader::rejectUnknownKeys() {
     for (const auto& entry : *source) {
-        if (std::find(knownKeys.begin(), knownKeys.end(), entry.first.str()) == knownKeys.end()) {
-            reject(entry.first.str(), "is unknown");
+        if (std::find(knownKeys.begin(), knownKeys.end(), entry.first) == knownKeys.end()) {
+            reject(entry.first, "is unknown");
         }
     }
 }

@@ -1,5 +1,7 @@
 #pragma once
 
+#include "configuration/Toml.h"
+
 #include <cstdint>
 #include <optional>
 #include <string>
@@ -7,36 +9,29 @@
 #include <utility>
 #include <vector>
 
-namespace toml {
-inline namespace v3 {
-class table;
-}
-}  // namespace toml
-
 namespace Agent {
 
-/** What is wrong with a configuration, one sentence a problem, in the order in which it was found. */
+/** Problems of a configuration, one sentence each, in the order in which they were found. */
 using Problems = std::vector<std::string>;
 
 /**
- * Reads the keys of one table of the configuration and notes what is wrong with them: values of the
- * wrong kind and, at the end, keys that nobody asked for. A value that is absent or wrong is no
- * value, so that the caller goes on with its default.
+ * Reads the keys of one table of the configuration and records its problems: values of the wrong kind and, at the end,
+ * unknown keys. For a value that is absent or wrong the functions return no value, and the caller uses its default.
  */
 class TableReader {
 public:
     /**
-     * @param table    the table; null is an empty one
-     * @param name     what problems call it, such as "log"; empty for the document itself
+     * @param table    the table; null for an empty one
+     * @param name     the table's name in problems, such as "log"; empty for the document
      * @param problems receives the problems
      */
-    TableReader(const toml::table* table, std::string name, Problems& problems);
+    TableReader(const TomlTable* table, std::string name, Problems& problems);
 
-    std::optional<std::string> text(std::string_view key);      ///< a string
-    std::optional<std::string> someText(std::string_view key);  ///< a string that is not empty
-    std::optional<bool> flag(std::string_view key);             ///< a boolean
+    std::optional<std::string> string(std::string_view key);
+    std::optional<std::string> nonEmptyString(std::string_view key);
+    std::optional<bool> flag(std::string_view key);
 
-    /** An integer that is not below minimum nor above maximum. */
+    /** An integer from minimum to maximum. */
     std::optional<std::int64_t> number(std::string_view key, std::int64_t minimum, std::int64_t maximum);
 
     /** The table under a key; an empty one if there is none. */
@@ -45,22 +40,24 @@ public:
     /** The tables of the array of tables under a key, in order. */
     std::vector<TableReader> tables(std::string_view key);
 
-    /** All keys with string values, in the order of the key names; the others are problems. */
-    std::vector<std::pair<std::string, std::string>> allTexts();
+    /** All keys with string values, in the order of the keys; records a problem for each other value. */
+    std::vector<std::pair<std::string, std::string>> allStrings();
 
-    /** Whether the key is there, of whatever kind its value is. Counts as asking for it. */
+    /** Returns whether the table has the key, with a value of any kind, and marks the key as known. */
     bool has(std::string_view key);
 
-    /** Notes a problem with the value of a key. */
+    /** Records a problem with the value of a key. */
     void reject(std::string_view key, const std::string& why);
 
-    /** Notes a problem for every key that was never asked for. */
+    /** Records a problem for each key that no other function has been called for. */
     void rejectUnknownKeys();
 
 private:
+    /** Returns the value of a key, null if there is none, and marks the key as known. */
+    const TomlValue* find(std::string_view key);
     std::string nameOf(std::string_view key) const;
 
-    const toml::table* source;
+    const TomlTable* source;
     std::string tableName;
     Problems* problems;
     std::vector<std::string> knownKeys;

@@ -1,14 +1,20 @@
 #pragma once
 
-// toml++ is compiled once, in Toml.cpp, and with its exceptions: without them, lack of memory ends the process.
-#define TOML_HEADER_ONLY 0
-#define TOML_EXCEPTIONS 1
-#define TOML_ENABLE_FORMATTERS 0
-// Values in values: the parser goes as deep, and so does the destruction of what it has made.
-#define TOML_MAX_NESTED_VALUES 16
+#include <map>
+#include <string>
+#include <vector>
 
-#pragma GCC diagnostic push
-#pragma GCC diagnostic ignored "-Wconversion"
-#pragma GCC diagnostic ignored "-Wshadow"
-#include <toml++/toml.h>
-#pragma GCC diagnostic pop
+// Declared here so that only the files that parse or read values include the library.
+namespace toml {
+struct discard_comments;
+template <typename Comments, template <typename...> class Table, template <typename...> class Array>
+class basic_value;
+}  // namespace toml
+
+namespace Agent {
+
+/** A value of the configuration file; its tables are sorted by key. */
+using TomlValue = toml::basic_value<toml::discard_comments, std::map, std::vector>;
+using TomlTable = std::map<std::string, TomlValue>;
+
+}  // namespace Agent

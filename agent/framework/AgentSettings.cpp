@@ -25,7 +25,7 @@ std::string defaultIdentifyingNumber() {
 
 std::string directory(Agent::TableReader& table, std::string_view key, const char* defaultDirectory) {
     std::string path = defaultDirectory;
-    if (std::optional<std::string> configured = table.someText(key)) {
+    if (std::optional<std::string> configured = table.nonEmptyString(key)) {
         if (configured->front() == '/' && configured->find('\0') == std::string::npos) {
             path = std::move(*configured);
         } else {
@@ -46,15 +46,15 @@ void readDirectories(Agent::TableReader table, AgentSettings& settings) {
 
 void readProduct(Agent::TableReader table, AgentSettings& settings) {
     auto& product = settings.product;
-    product.name = table.someText("name").value_or("Ostrel");
-    product.version = table.someText("version").value_or(AGENT_VERSION);
-    product.buildNumber = table.someText("build_number").value_or("1");
-    if (std::optional<std::string> number = table.someText("identifying_number")) {
+    product.name = table.nonEmptyString("name").value_or("Ostrel");
+    product.version = table.nonEmptyString("version").value_or(AGENT_VERSION);
+    product.buildNumber = table.nonEmptyString("build_number").value_or("1");
+    if (std::optional<std::string> number = table.nonEmptyString("identifying_number")) {
         product.identifyingNumber = std::move(*number);
     } else {
         product.identifyingNumber = defaultIdentifyingNumber();
     }
-    product.vendor = table.someText("vendor").value_or("VEL");
+    product.vendor = table.nonEmptyString("vendor").value_or("VEL");
     table.rejectUnknownKeys();
 }
 
@@ -66,7 +66,7 @@ std::optional<unsigned int> propertyNumber(const std::string& text) {
 }
 
 void readProperties(Agent::TableReader table, Node& node) {
-    for (auto& [key, value] : table.allTexts()) {
+    for (auto& [key, value] : table.allStrings()) {
         if (const std::optional<unsigned int> number = propertyNumber(key)) {
             node.properties[*number] = value;
         } else {
@@ -77,7 +77,7 @@ void readProperties(Agent::TableReader table, Node& node) {
 
 void readNode(Agent::TableReader& table, std::vector<Node>& nodes) {
     const std::optional<std::int64_t> type = table.number("type", 0, largestNumber);
-    const std::optional<std::string> path = table.someText("path");
+    const std::optional<std::string> path = table.nonEmptyString("path");
     Node node;
     readProperties(table.table("properties"), node);
     table.rejectUnknownKeys();

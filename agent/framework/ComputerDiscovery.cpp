@@ -2,7 +2,7 @@
 
 #include "KO/NodeLexicon.h"
 #include "configuration/FileContent.h"
-#include "configuration/Utf8.h"
+#include "cim/Utf8.h"
 #include "framework/AsciiCase.h"
 
 #include <unistd.h>
@@ -84,7 +84,7 @@ bool isPlaceholder(const std::string& text) {
 std::string tidy(std::string_view text) {
     std::string tidied;
     for (; !text.empty();) {
-        const Agent::Utf8Character character = Agent::firstCharacter(text);
+        const cim::Utf8Character character = cim::firstCharacter(text);
         if (character.valid && character.codePoint > ' ' &&
             (character.codePoint < 0x7f || character.codePoint > 0x9f)) {
             tidied += text.substr(0, character.length);

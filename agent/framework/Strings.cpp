@@ -1,6 +1,6 @@
 #include "KO/Strings.h"
 
-#include "configuration/Utf8.h"
+#include "cim/Utf8.h"
 
 #include <cstdint>
 
@@ -14,32 +14,6 @@ constexpr std::uint32_t lastByteCarrier = 0xDCFF;
 constexpr std::uint32_t byteCarrierBase = 0xDC00;
 constexpr std::uint32_t replacementCharacter = 0xFFFD;
 
-void appendUtf8(std::string& text, std::uint32_t codePoint) {
-    const auto append = [&text](std::uint32_t byte) { text.push_back(static_cast<char>(byte)); };
-    const auto appendTail = [&append, codePoint](unsigned int shift) {
-        append(0x80U | ((codePoint >> shift) & 0x3FU));
-    };
-    if (codePoint < 0x80) {
-        append(codePoint);
-    } else if (codePoint < 0x800) {
-        append(0xC0U | (codePoint >> 6U));
-        appendTail(0);
-    } else if (codePoint < 0x10000) {
-        append(0xE0U | (codePoint >> 12U));
-        appendTail(6);
-        appendTail(0);
-    } else {
-        append(0xF0U | (codePoint >> 18U));
-        appendTail(12);
-        appendTail(6);
-        appendTail(0);
-    }
-}
-
-bool canBeEncoded(std::uint32_t number) {
-    return number <= 0x10FFFF && (number < 0xD800 || number > 0xDFFF);
-}
-
 }  // namespace
 
 std::string make_string(const std::wstring& text) {
@@ -50,7 +24,7 @@ std::string make_string(const std::wstring& text) {
         if (number >= firstByteCarrier && number <= lastByteCarrier) {
             narrow.push_back(static_cast<char>(number - byteCarrierBase));
         } else {
-            appendUtf8(narrow, canBeEncoded(number) ? number : replacementCharacter);
+            cim::appendUtf8(narrow, cim::isCodePoint(number) ? number : replacementCharacter);
         }
     }
     return narrow;
@@ -64,7 +38,7 @@ std::wstring make_wstring(const std::string& text) {
     std::wstring wide;
     wide.reserve(text.size());
     for (std::string_view rest = text; !rest.empty();) {
-        const Agent::Utf8Character character = Agent::firstCharacter(rest);
+        const cim::Utf8Character character = cim::firstCharacter(rest);
         wide.push_back(
             static_cast<wchar_t>(character.valid ? character.codePoint : byteCarrierBase + character.codePoint));
         rest.remove_prefix(character.length);

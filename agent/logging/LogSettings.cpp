@@ -7,7 +7,7 @@ namespace RZLog {
 namespace {
 
 void readDestination(Agent::TableReader& table, LogSettings& settings) {
-    const std::string text = table.someText("destination").value_or("none");
+    const std::string text = table.nonEmptyString("destination").value_or("none");
     if (text == "none") {
         return;
     }
@@ -32,7 +32,7 @@ ChannelLevels readLevels(Agent::TableReader& table, ChannelLevels defaults) {
 }
 
 void readLogger(Agent::TableReader& table, ChannelLevels defaults, Levels& levels) {
-    const std::optional<std::string> name = table.someText("name");
+    const std::optional<std::string> name = table.nonEmptyString("name");
     const ChannelLevels ownLevels = readLevels(table, defaults);
     table.rejectUnknownKeys();
     if (!name) {

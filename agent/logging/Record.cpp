@@ -1,6 +1,6 @@
 #include "logging/Record.h"
 
-#include "configuration/Utf8.h"
+#include "cim/Utf8.h"
 
 #include <cstdio>
 #include <ctime>
@@ -69,7 +69,7 @@ void appendEscapedCharacter(std::string& line, std::string_view character) {
 
 void appendEscaped(std::string& line, std::string_view field) {
     while (!field.empty()) {
-        const Agent::Utf8Character character = Agent::firstCharacter(field);
+        const cim::Utf8Character character = cim::firstCharacter(field);
         const std::string_view bytes = field.substr(0, character.length);
         const bool c1Control = character.valid && character.codePoint >= 0x80 && character.codePoint < 0xA0;
         if (isPrintable(bytes.front()) || (character.valid && character.codePoint > 0x7f && !c1Control)) {

@@ -29,7 +29,7 @@ protected:
 
 TEST_F(TableReaderTest, GivesValuesOfTheRightKind) {
     TableReader table = read("text = 'x'\nflag = true\nnumber = 7\n");
-    EXPECT_EQ(table.text("text"), "x");
+    EXPECT_EQ(table.string("text"), "x");
     EXPECT_EQ(table.flag("flag"), true);
     EXPECT_EQ(table.number("number", 0, 10), 7);
     EXPECT_THAT(problems, IsEmpty());
@@ -37,23 +37,23 @@ TEST_F(TableReaderTest, GivesValuesOfTheRightKind) {
 
 TEST_F(TableReaderTest, GivesNothingForAnAbsentKeyAndThatIsNoProblem) {
     TableReader table = read("");
-    EXPECT_EQ(table.text("text"), std::nullopt);
-    EXPECT_EQ(table.someText("text"), std::nullopt);
+    EXPECT_EQ(table.string("text"), std::nullopt);
+    EXPECT_EQ(table.nonEmptyString("text"), std::nullopt);
     EXPECT_EQ(table.flag("flag"), std::nullopt);
     EXPECT_EQ(table.number("number", 0, 10), std::nullopt);
     EXPECT_THAT(table.tables("tables"), IsEmpty());
-    EXPECT_EQ(table.table("table").text("text"), std::nullopt);
+    EXPECT_EQ(table.table("table").string("text"), std::nullopt);
     EXPECT_THAT(problems, IsEmpty());
 }
 
 TEST_F(TableReaderTest, NotesValuesOfTheWrongKind) {
     TableReader table = read("text = 1\nempty = ''\nflag = 'yes'\nnumber = 11\nword = 'x'\ntable = 1\ntables = [1]\n");
-    EXPECT_EQ(table.text("text"), std::nullopt);
-    EXPECT_EQ(table.someText("empty"), std::nullopt);
+    EXPECT_EQ(table.string("text"), std::nullopt);
+    EXPECT_EQ(table.nonEmptyString("empty"), std::nullopt);
     EXPECT_EQ(table.flag("flag"), std::nullopt);
     EXPECT_EQ(table.number("number", 0, 10), std::nullopt);
     EXPECT_EQ(table.number("word", 0, 10), std::nullopt);
-    EXPECT_EQ(table.table("table").text("x"), std::nullopt);
+    EXPECT_EQ(table.table("table").string("x"), std::nullopt);
     EXPECT_THAT(table.tables("tables"), IsEmpty());
     EXPECT_THAT(problems, ElementsAre("configuration key text must be a string; ignored",
                                       "configuration key empty must not be empty; ignored",
@@ -67,9 +67,9 @@ TEST_F(TableReaderTest, NotesValuesOfTheWrongKind) {
 TEST_F(TableReaderTest, NamesKeysOfInnerTablesInFull) {
     TableReader root = read("[outer]\ninner.key = 1\n[[outer.list]]\n[[outer.list]]\nkey = 2\n");
     TableReader outer = root.table("outer");
-    outer.table("inner").text("key");
+    outer.table("inner").string("key");
     for (TableReader& each : outer.tables("list")) {
-        each.text("key");
+        each.string("key");
     }
     EXPECT_THAT(problems, ElementsAre("configuration key outer.inner.key must be a string; ignored",
                                       "configuration key outer.list[1].key must be a string; ignored"));
@@ -77,7 +77,7 @@ TEST_F(TableReaderTest, NamesKeysOfInnerTablesInFull) {
 
 TEST_F(TableReaderTest, NotesKeysThatNobodyAskedFor) {
     TableReader table = read("known = 'x'\nunknown = 'y'\n[section]\n");
-    table.text("known");
+    table.string("known");
     table.rejectUnknownKeys();
     EXPECT_THAT(problems, ElementsAre("configuration key section is unknown; ignored",
                                       "configuration key unknown is unknown; ignored"));
@@ -85,7 +85,7 @@ TEST_F(TableReaderTest, NotesKeysThatNobodyAskedFor) {
 
 TEST_F(TableReaderTest, GivesAllTextsAndNotesTheOthers) {
     TableReader table = read("b = 'second'\na = ''\nc = 3\n");
-    EXPECT_THAT(table.allTexts(), ElementsAre(Pair("a", ""), Pair("b", "second")));
+    EXPECT_THAT(table.allStrings(), ElementsAre(Pair("a", ""), Pair("b", "second")));
     EXPECT_THAT(problems, ElementsAre("configuration key c must be a string; ignored"));
 }
 

@@ -88,7 +88,7 @@ protected:
 };
 
 TEST_F(LoadFaultTest, TheLibraryLoadsAllRecordsOrNoneIfAllocationsFail) {
-    failEach({{operationAllocate, 0}}, {});  // malloc is called only by the dynamic linker
+    failEach({{operationAllocate, 0}}, {true, 400});  // malloc is called only by the dynamic linker
 }
 
 /** Fields that are not read count as missing: the library must not mistake a failure for the end of the file. */

@@ -1,11 +1,11 @@
-#include "configuration/Utf8.h"
+#include "cim/Utf8.h"
 
 #include <gtest/gtest.h>
 
 #include <ostream>
 
-using Agent::firstCharacter;
-using Agent::Utf8Character;
+using cim::firstCharacter;
+using cim::Utf8Character;
 
 namespace {
 
@@ -46,3 +46,29 @@ INSTANTIATE_TEST_SUITE_P(
                     Case{"a surrogate", "\xED\xA0\x80", 0xED, 1, false}, Case{"cut off", "\xE2\x82", 0xE2, 1, false},
                     Case{"broken off", "\xE2\x82x", 0xE2, 1, false},
                     Case{"never a first byte", "\xFF", 0xFF, 1, false}));
+
+TEST(Utf8, IsDecodedAsItIsEncoded) {
+    for (const std::uint32_t codePoint :
+         {0x00U, 0x7FU, 0x80U, 0x7FFU, 0x800U, 0xD7FFU, 0xE000U, 0xFFFFU, 0x10000U, 0x10FFFFU}) {
+        std::string bytes;
+        cim::appendUtf8(bytes, codePoint);
+        const Utf8Character character = firstCharacter(bytes + "next");
+        EXPECT_TRUE(character.valid) << codePoint;
+        EXPECT_EQ(character.codePoint, codePoint);
+        EXPECT_EQ(character.length, bytes.size());
+    }
+}
+
+TEST(Utf8, HasNoSurrogatesAndEndsAtPlaneSixteen) {
+    for (const std::uint32_t number : {0xD800U, 0xDFFFU, 0x110000U, 0xFFFFFFFFU}) {
+        EXPECT_FALSE(cim::isCodePoint(number)) << number;
+    }
+    EXPECT_TRUE(cim::isCodePoint(0xD7FF));
+    EXPECT_TRUE(cim::isCodePoint(0x10FFFF));
+}
+
+TEST(Utf8, IsInvalidFromTheFirstByteOfABrokenCharacter) {
+    EXPECT_EQ(cim::findInvalidUtf8(""), std::string_view::npos);
+    EXPECT_EQ(cim::findInvalidUtf8("a\xC3\xA9\xE2\x82\xAC"), std::string_view::npos);
+    EXPECT_EQ(cim::findInvalidUtf8("a\xC3\xA9\xE2\x82"), 3U);
+}

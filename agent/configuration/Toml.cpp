@@ -1,2 +1,0 @@
-#define TOML_IMPLEMENTATION
-#include "configuration/Toml.h"
