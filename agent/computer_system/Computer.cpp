@@ -2,8 +2,7 @@
 
 #include "KO/Instrumentation.h"
 #include "KO/ProviderUtilities.h"
-
-#include <strings.h>
+#include "cim/Names.h"
 
 namespace KO::ComputerSystem {
 
@@ -34,11 +33,11 @@ std::optional<std::string> read(Instrumentation& node, NodeLexicon::Properties p
 }
 
 bool isWanted(const char* name, const char** wanted) {
-    if (wanted == nullptr || ::strcasecmp(name, keyName) == 0) {
+    if (wanted == nullptr || cim::sameName(name, keyName)) {
         return true;
     }
     for (; *wanted != nullptr; ++wanted) {
-        if (::strcasecmp(name, *wanted) == 0) {
+        if (cim::sameName(name, *wanted)) {
             return true;
         }
     }

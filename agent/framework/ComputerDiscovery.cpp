@@ -1,9 +1,9 @@
 #include "framework/ComputerDiscovery.h"
 
 #include "KO/NodeLexicon.h"
-#include "configuration/FileContent.h"
+#include "cim/Names.h"
 #include "cim/Utf8.h"
-#include "framework/AsciiCase.h"
+#include "configuration/FileContent.h"
 
 #include <unistd.h>
 
@@ -77,7 +77,7 @@ constexpr const char* chassisWords[] = {
 
 bool isPlaceholder(const std::string& text) {
     return std::any_of(std::begin(placeholders), std::end(placeholders),
-                       [&text](const char* placeholder) { return equalIgnoringCase(placeholder, text); });
+                       [&text](const char* placeholder) { return cim::sameName(placeholder, text); });
 }
 
 /** Folds runs of blanks, control characters and bytes that are not UTF-8 into one blank; none at the ends. */

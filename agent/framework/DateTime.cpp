@@ -1,6 +1,6 @@
 #include "KO/DateTime.h"
 
-#include "framework/CimDateTime.h"
+#include "cim/DateTime.h"
 #include "framework/DateTimeAccess.h"
 
 #include <ctime>
@@ -27,7 +27,7 @@ struct DateTime::Implementation {
 DateTime::DateTime() : implementation(std::make_unique<Implementation>()) {}
 
 DateTime::DateTime(long seconds, unsigned int kind) : DateTime() {
-    implementation->text = pointInTimeText(seconds, kind == localTime ? localOffset(seconds) : 0);
+    implementation->text = cim::formatPointInTime(seconds, kind == localTime ? localOffset(seconds) : 0);
 }
 
 DateTime::DateTime(const DateTime& other) : implementation(std::make_unique<Implementation>(*other.implementation)) {}
@@ -44,7 +44,7 @@ std::string DateTimeAccess::text(const DateTime& date) {
 
 DateTime DateTimeAccess::fromText(const std::string& text) {
     DateTime date;
-    if (isPointInTime(text)) {
+    if (cim::isPointInTime(text)) {
         date.implementation->text = text;
     }
     return date;

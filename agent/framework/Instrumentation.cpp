@@ -1,14 +1,14 @@
 #include "KO/Instrumentation.h"
 
+#include "framework/AgentState.h"
 #include "framework/NodePath.h"
-#include "framework/ThisAgent.h"
 
 #include <vector>
 
 namespace KO {
 
 struct Instrumentation::Implementation {
-    std::shared_ptr<const ThisAgent> agent = thisAgent();
+    std::shared_ptr<const AgentState> agent = agentState();
     std::vector<const Node*> selected;
     std::size_t position = 0;
 

@@ -1,15 +1,15 @@
 #include "KO/PlatformUtilities.h"
 
-#include "framework/ThisAgent.h"
+#include "framework/AgentState.h"
 
 namespace KO {
 
 // The texts outlive the calls: the agent stays until the library goes.
 const char* PlatformUtilities::getKelsaDirectory() {
-    return thisAgent()->settings.installDirectory.c_str();
+    return agentState()->settings.installDirectory.c_str();
 }
 const char* PlatformUtilities::getKelsaDataDir() {
-    return thisAgent()->settings.dataDirectory.c_str();
+    return agentState()->settings.dataDirectory.c_str();
 }
 
 }  // namespace KO

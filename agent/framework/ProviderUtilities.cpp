@@ -2,8 +2,8 @@
 
 #include "KO/ClassIds.h"
 #include "KO/Moniker.h"
-#include "framework/AsciiCase.h"
-#include "framework/CimDateTime.h"
+#include "cim/DateTime.h"
+#include "cim/Names.h"
 #include "framework/CmpiValue.h"
 
 #include <algorithm>
@@ -54,7 +54,7 @@ void setPropertyValue(CMPIInstance* instance, const char* name, const CMPIValue*
 }
 
 CMPIDateTime* makeDateTime(const CMPIBroker* broker, const std::string& text) {
-    if (!isPointInTime(text) && !isInterval(text)) {
+    if (!cim::isPointInTime(text) && !cim::isInterval(text)) {
         return nullptr;
     }
     return cim::make<&CMPIBrokerEncFT::newDateTimeFromChars>(broker, text.c_str());
@@ -79,7 +79,7 @@ unsigned short ProviderUtilities::getClassId(const CMPIObjectPath* path) {
 unsigned short ProviderUtilities::getClassId(const char* className) {
     if (className != nullptr) {
         for (const ClassEntry& entry : classIds) {
-            if (equalIgnoringCase(entry.className, className)) {
+            if (cim::sameName(entry.className, className)) {
                 return entry.id;
             }
         }

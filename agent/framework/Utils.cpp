@@ -1,6 +1,6 @@
 #include "KO/Utils.h"
 
-#include "framework/CimDateTime.h"
+#include "cim/DateTime.h"
 #include "framework/DateTimeAccess.h"
 #include "framework/PropertyFileAccess.h"
 
@@ -24,7 +24,7 @@ void Utils::WriteDateToFile(PropertyFile& file, const std::string& key, const Da
 
 std::string Utils::convertCIMDateTime(DateTime value) {
     const std::string text = DateTimeAccess::text(value);
-    return text.empty() ? std::string(noDateText) : text;
+    return text.empty() ? std::string(cim::noDate) : text;
 }
 
 DateTime Utils::convertStringToDateTime(std::string text) {

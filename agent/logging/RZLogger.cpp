@@ -18,15 +18,15 @@ std::string_view orEmpty(const char* text) {
  * Whoever logs an error of the system still wants to look at errno afterwards. And a thread that is cancelled goes on
  * until the record is written: the system unwinds it by what looks like an exception, and no catch may keep that.
  */
-class Undisturbed {
+class PreserveErrno {
 public:
-    Undisturbed() : error(errno) { ::pthread_setcancelstate(PTHREAD_CANCEL_DISABLE, &cancelling); }
-    ~Undisturbed() {
+    PreserveErrno() : error(errno) { ::pthread_setcancelstate(PTHREAD_CANCEL_DISABLE, &cancelling); }
+    ~PreserveErrno() {
         ::pthread_setcancelstate(cancelling, nullptr);
         errno = error;
     }
-    Undisturbed(const Undisturbed&) = delete;
-    Undisturbed& operator=(const Undisturbed&) = delete;
+    PreserveErrno(const PreserveErrno&) = delete;
+    PreserveErrno& operator=(const PreserveErrno&) = delete;
 
 private:
     int error;
@@ -37,7 +37,7 @@ void writeIfAdmitted(const Record& record) noexcept {
     if (record.level > highestLevel()) {
         return;
     }
-    const Undisturbed undisturbed;
+    const PreserveErrno preserveErrno;
     try {
         if (record.level <= levelsOf(record.logger).of(record.channel)) {
             write(record);
@@ -62,7 +62,7 @@ bool RZLogger::admits(const std::string& logger, int level) noexcept {
     if (level > highestLevel()) {  // nearly always: most records are asked about, and never written
         return false;
     }
-    const Undisturbed undisturbed;
+    const PreserveErrno preserveErrno;
     try {
         return level <= levelsOf(logger).highest();
     } catch (...) {

@@ -1,4 +1,4 @@
-#include "framework/ThisAgent.h"
+#include "framework/AgentState.h"
 
 #include "RZLog/RZLogger.h"
 #include "framework/ComputerDiscovery.h"
@@ -13,14 +13,14 @@ void report(const Agent::Problems& problems) {
     constexpr int errorLevel = 3000;
     for (const std::string& problem : problems) {
         for (const auto write : {&RZLog::RZLogger::logLevelMessage, &RZLog::RZLogger::traceLevelMessage}) {
-            write(__func__, "ThisAgent.cpp", __LINE__, "Ostrel.Agent", errorLevel, nullptr, 0, 0, problem);
+            write(__func__, "AgentState.cpp", __LINE__, "Ostrel.Agent", errorLevel, nullptr, 0, 0, problem);
         }
     }
 }
 
-std::shared_ptr<const ThisAgent> readThisAgent() {
+std::shared_ptr<const AgentState> readAgentState() {
     Agent::Problems problems;
-    auto agent = std::make_shared<ThisAgent>();
+    auto agent = std::make_shared<AgentState>();
     agent->settings = readAgentSettings(Agent::Document::readDefault(), problems);
     if (agent->settings.discover) {
         agent->tree = discoverComputer(agent->settings.dmiRoot, hostName(), problems);
@@ -35,7 +35,7 @@ std::shared_ptr<const ThisAgent> readThisAgent() {
 // Threads may still ask while the process ends and static objects go: what they touch then is the
 // mutex and the pointer, which need no destruction.
 std::mutex agentMutex;
-std::shared_ptr<const ThisAgent>* agent = nullptr;
+std::shared_ptr<const AgentState>* agent = nullptr;
 
 struct AgentOwner {
     ~AgentOwner() {
@@ -47,10 +47,10 @@ struct AgentOwner {
 
 }  // namespace
 
-std::shared_ptr<const ThisAgent> thisAgent() {
+std::shared_ptr<const AgentState> agentState() {
     const std::lock_guard<std::mutex> lock(agentMutex);
     if (agent == nullptr) {
-        agent = new std::shared_ptr<const ThisAgent>(readThisAgent());
+        agent = new std::shared_ptr<const AgentState>(readAgentState());
     }
     return *agent;
 }

@@ -1,0 +1,42 @@
+#include "cim/Names.h"
+
+#include <algorithm>
+
+namespace cim {
+namespace {
+
+char lower(char c) {
+    return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c;
+}
+
+bool startsName(char c) {
+    return (lower(c) >= 'a' && lower(c) <= 'z') || c == '_';
+}
+
+bool continuesName(char c) {
+    return startsName(c) || (c >= '0' && c <= '9');
+}
+
+}  // namespace
+
+bool sameName(std::string_view left, std::string_view right) {
+    return left.size() == right.size() &&
+           std::equal(left.begin(), left.end(), right.begin(), [](char a, char b) { return lower(a) == lower(b); });
+}
+
+std::string foldedName(std::string_view name) {
+    std::string folded(name);
+    std::transform(folded.begin(), folded.end(), folded.begin(), lower);
+    return folded;
+}
+
+bool NameLess::operator()(std::string_view left, std::string_view right) const {
+    return std::lexicographical_compare(left.begin(), left.end(), right.begin(), right.end(),
+                                        [](char a, char b) { return lower(a) < lower(b); });
+}
+
+bool isName(std::string_view string) {
+    return !string.empty() && startsName(string.front()) && std::all_of(string.begin(), string.end(), continuesName);
+}
+
+}  // namespace cim
