@@ -1,5 +1,5 @@
-# Installs the configuration file "new" into "directory", which may be seen from the prefix. One that is there and not
-# the same is the administrator's: it is kept, and the new one comes to lie beside it.
+# Installs the configuration file "new" into "directory", absolute or relative to the prefix. If another version is
+# installed, it may have the administrator's changes: it is kept, and the new one is installed as agent.toml.new.
 cmake_path(ABSOLUTE_PATH directory BASE_DIRECTORY "${CMAKE_INSTALL_PREFIX}")
 set(kept "$ENV{DESTDIR}${directory}/agent.toml")
 set(name agent.toml)

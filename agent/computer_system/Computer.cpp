@@ -11,7 +11,7 @@ namespace {
 constexpr const char* className = "VELKO_ComputerSystem";
 constexpr const char* keyName = "Name";
 
-/** One property of the class: its CIM name and where it comes from. */
+/** One property of the class: its CIM name and its value. */
 struct Property {
     const char* name;
     std::optional<std::string> (*value)(const Computer& computer);

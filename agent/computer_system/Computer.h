@@ -14,15 +14,15 @@ struct Computer {
     std::optional<std::string> vendor;
     std::optional<std::string> productName;  ///< "model - suffix"
 
-    /** What stands before the first dash of the product name; none without product name. */
+    /** The part of the product name before its first dash; none without product name. */
     std::optional<std::string> model() const;
 };
 
-/** All computers of the tree, in tree order. One without a name has no identity and is left out. */
+/** All computers of the tree that have a name, in tree order. */
 std::vector<Computer> allComputers();
 
 /** @name CIM objects of a computer
- * Made through the broker, which owns them; null when it cannot make them.
+ * Created by the broker, which owns them; null if it fails.
  */
 ///@{
 CMPIObjectPath* makePath(const CMPIBroker* broker, const std::string& nameSpace, const Computer& computer);

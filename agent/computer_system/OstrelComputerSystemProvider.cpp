@@ -8,8 +8,7 @@
 #include <atomic>
 #include <exception>
 
-// Answers for VELKO_ComputerSystem, read-only. Nothing is kept from one request to the next but the
-// broker, so requests may come on any number of threads.
+// Serves VELKO_ComputerSystem, read-only. Requests share only the broker, and may run concurrently.
 
 namespace KO::ComputerSystem {
 
@@ -31,7 +30,7 @@ CMPIStatus notSupported() {
     return status(CMPI_RC_ERR_NOT_SUPPORTED);
 }
 
-/** One request: who wants what, and in which namespace. */
+/** Broker, result and namespace of a request. */
 struct Request {
     const CMPIBroker* broker;
     const CMPIResult* result;
@@ -73,7 +72,7 @@ CMPIStatus guarded(const CMPIObjectPath* path, const Handler& handler) noexcept 
     }
 }
 
-/** Hands all computers over, one by one, until one cannot be. */
+/** Returns all computers, one by one, until one fails. */
 template <typename Return>
 CMPIStatus returnAll(const Request& request, const Return& returnOne) {
     for (const Computer& computer : allComputers()) {

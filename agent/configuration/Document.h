@@ -9,8 +9,8 @@
 namespace Agent {
 
 /**
- * The agent's configuration file, read and parsed. A file that is absent is an empty document; one
- * that cannot be read or parsed is an empty document with a problem.
+ * The agent's configuration file, parsed. An absent file is an empty document; a file that cannot be read or parsed is
+ * an empty document with a problem.
  */
 class Document {
 public:
@@ -18,22 +18,22 @@ public:
     static Document read(const std::string& path);
 
     /**
-     * Reads the file that this process is configured by: the one that OSTREL_CONFIG names, else
-     * /etc/ostrel/agent.toml. A process that runs with another's privileges ignores the variable.
+     * Reads the configuration file of this process: the one that OSTREL_CONFIG names, else /etc/ostrel/agent.toml. A
+     * process that runs with another user's privileges ignores the variable.
      */
     static Document readDefault();
 
-    /** Parses a text; name is what problems call it. */
+    /** Parses a document; problems contain the name. */
     static Document parse(std::string_view text, const std::string& name);
 
     Document(Document&&) noexcept;
     Document& operator=(Document&&) noexcept;
     ~Document();
 
-    /** Why the file could not be used, one sentence; empty when it could. */
+    /** One sentence on why the file could not be used; empty if it was used. */
     const std::string& problem() const { return whatIsWrong; }
 
-    /** A reader of the whole document. It must not outlive the document or the problems. */
+    /** Returns a reader of the document. It must not outlive the document or the problems. */
     TableReader root(Problems& problems) const;
 
 private:

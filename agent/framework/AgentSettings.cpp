@@ -11,7 +11,7 @@ namespace {
 
 constexpr std::int64_t largestNumber = 0xFFFF;
 
-/** A number derived from the machine's that does not give the machine's own away. */
+/** A number derived from the machine id that does not reveal the machine id. */
 std::string defaultIdentifyingNumber() {
     sd_id128_t agent{};
     sd_id128_t number{};
@@ -70,7 +70,7 @@ void readProperties(Agent::TableReader table, Node& node) {
         if (const std::optional<unsigned int> number = propertyNumber(key)) {
             node.properties[*number] = value;
         } else {
-            table.reject(key, "is no property number");
+            table.reject(key, "is not a property number");
         }
     }
 }
@@ -102,7 +102,7 @@ void readInstrumentation(Agent::TableReader table, AgentSettings& settings) {
     table.rejectUnknownKeys();
 }
 
-/** Switches of those who work beside the provider (KO::Settings): a table and its keys. */
+/** Reads flags for KO::Settings: a table and its keys. */
 void readFlags(Agent::TableReader table, const std::string& name, std::initializer_list<const char*> keys,
                AgentSettings& settings) {
     for (const char* key : keys) {

@@ -7,9 +7,9 @@
 
 namespace KO {
 
-/** What the configuration says to the framework: every table but [log]. */
+/** The framework's part of the configuration: every table except [log]. */
 struct AgentSettings {
-    std::string installDirectory;  ///< ends with a separator, like the next
+    std::string installDirectory;  ///< ends with a separator, as does dataDirectory
     std::string dataDirectory;
 
     struct {
@@ -22,12 +22,12 @@ struct AgentSettings {
 
     std::string dmiRoot;      ///< directory of the kernel's DMI files
     bool discover;            ///< whether the computer is discovered
-    std::vector<Node> nodes;  ///< nodes to be added, or put in the place of discovered ones
+    std::vector<Node> nodes;  ///< nodes to add, or to replace discovered ones
 
-    std::map<std::string, bool> flags;  ///< the switches that are set, by table and key: "gate.refuse_lossy_values"
+    std::map<std::string, bool> flags;  ///< the configured flags, by table and key: "gate.refuse_lossy_values"
 };
 
-/** Reads the settings; every value that is absent or wrong has its default. */
+/** Reads the settings; absent and wrong values have their defaults. */
 AgentSettings readAgentSettings(const Agent::Document& document, Agent::Problems& problems);
 
 }  // namespace KO

@@ -32,8 +32,8 @@ std::shared_ptr<const AgentState> readAgentState() {
     return agent;
 }
 
-// Threads may still ask while the process ends and static objects go: what they touch then is the
-// mutex and the pointer, which need no destruction.
+// Threads may call agentState() while static objects are destroyed at exit. They use only the mutex and the pointer
+// then, which need no destruction.
 std::mutex agentMutex;
 std::shared_ptr<const AgentState>* agent = nullptr;
 

@@ -7,15 +7,15 @@
 
 namespace KO {
 
-/** What the agent knows of itself and of the managed system: its configuration and what it found. */
+/** The agent's configuration, and the nodes of the managed system. */
 struct AgentState {
     AgentSettings settings;
     NodeTree tree;
 };
 
 /**
- * The agent of this process. The first call reads the configuration and the managed system, and
- * reports in the log what is wrong with either; later calls cost next to nothing. Never null.
+ * The state of this process's agent. The first call reads the configuration, discovers the managed system, and logs the
+ * problems of both. Never null.
  */
 std::shared_ptr<const AgentState> agentState();
 

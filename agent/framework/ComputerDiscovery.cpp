@@ -14,7 +14,7 @@ namespace KO {
 
 namespace {
 
-/** What careless firmware says where it has nothing to say; compared without regard to letter case. */
+/** Placeholders of firmware for missing values, compared without letter case. */
 constexpr const char* placeholders[] = {
     "",
     "default string",
@@ -35,7 +35,7 @@ constexpr const char* placeholders[] = {
     "unknown",
 };
 
-/** The words of SMBIOS for its chassis types, from 1 on; empty for those that tell nothing. */
+/** The names of SMBIOS for chassis types, starting with 1; empty for those without meaning. */
 constexpr const char* chassisWords[] = {
     "",  // Other
     "",  // Unknown
@@ -99,13 +99,13 @@ std::string tidy(std::string_view text) {
     return tidied;
 }
 
-/** The text as it can be shown; empty if it says nothing. */
+/** The printable string; empty if it is a placeholder. */
 std::string meaningful(std::string_view text) {
     std::string tidied = tidy(text);
     return isPlaceholder(tidied) ? std::string() : tidied;
 }
 
-/** The text of a DMI file; empty if the file is absent or unreadable, or says nothing. */
+/** The value of a DMI file; empty if the file is absent, unreadable or a placeholder. */
 std::string readDmi(const std::string& path, Agent::Problems& problems) {
     const Agent::FileContent file = Agent::readFile(path);
     if (file.error != 0 && !file.absent()) {

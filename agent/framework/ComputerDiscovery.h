@@ -7,7 +7,7 @@
 
 namespace KO {
 
-/** This computer's name on the network; "localhost" when the system does not tell it. */
+/** This computer's host name; "localhost" if the system has none. */
 std::string hostName();
 
 /**
@@ -15,7 +15,7 @@ std::string hostName();
  * product name.
  * @param dmiRoot directory of the kernel's DMI files, ending with a separator
  * @param name    the computer's name
- * @param problems receives a sentence for each file that is there and cannot be read
+ * @param problems receives a sentence for each existing file that cannot be read
  */
 NodeTree discoverComputer(const std::string& dmiRoot, const std::string& name, Agent::Problems& problems);
 

@@ -19,7 +19,7 @@ int localOffset(std::time_t moment) {
 
 }  // namespace
 
-/** The date is held as its text, in which nothing is lost that a client gave; empty is no date. */
+/** Holds the date as its CIM datetime string, to keep all digits of the client; empty for no date. */
 struct DateTime::Implementation {
     std::string text;
 };

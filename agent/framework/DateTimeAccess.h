@@ -6,13 +6,13 @@
 
 namespace KO {
 
-/** The way of the framework's other classes to what a DateTime holds. */
+/** Gives the framework's other classes access to the content of a DateTime. */
 class DateTimeAccess {
 public:
-    /** The CIM datetime text of a date; empty for no date. */
+    /** The CIM datetime of a date; empty for no date. */
     static std::string text(const DateTime& date);
 
-    /** The date that a CIM datetime text tells; no date when it is no point in time. */
+    /** The date of a CIM datetime; no date unless the string is a point in time. */
     static DateTime fromText(const std::string& text);
 };
 

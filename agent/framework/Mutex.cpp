@@ -30,7 +30,7 @@ timespec afterMilliseconds(unsigned long milliseconds) {
 
 }  // namespace
 
-/** The error checking kind: a second lock of one thread is an error to report, not a thread to lose. */
+/** Checks errors: a second lock by the same thread fails instead of deadlocking. */
 struct Mutex::Implementation {
     pthread_mutex_t mutex{};
 
@@ -46,7 +46,7 @@ struct Mutex::Implementation {
     Implementation& operator=(const Implementation&) = delete;
 };
 
-// Mutexes are static objects: where memory is lacking, it is lock() that fails, not the loading of their library.
+// Mutexes are static objects: if out of memory, lock() fails, not the loading of their library.
 Mutex::Mutex() : implementation(new (std::nothrow) Implementation) {}
 Mutex::~Mutex() = default;
 

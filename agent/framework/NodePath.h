@@ -5,12 +5,12 @@
 namespace KO {
 
 /**
- * The printable form of a node path: every byte but letters, digits and . / : - becomes %NN, with
- * the byte in upper-case hexadecimal digits.
+ * Encodes a node path: every byte except letters, digits and . / : - becomes %NN, with the byte in upper-case
+ * hexadecimal digits.
  */
 std::string pathToText(const std::string& path);
 
-/** The path of a printable form. A text that pathToText does not give for any path is given back. */
+/** Decodes a path. Returns strings that are not the encoding of any path unchanged. */
 std::string textToPath(const std::string& text);
 
 }  // namespace KO

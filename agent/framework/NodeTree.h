@@ -16,7 +16,7 @@ struct Node {
 /** The nodes of the managed system, in tree order; no two have the same path. */
 class NodeTree {
 public:
-    /** Adds a node at the end, or puts it in the place of the one at its path. */
+    /** Adds a node at the end, or replaces the node with the same path. */
     void put(Node node);
 
     const std::vector<Node>& nodes() const { return allNodes; }

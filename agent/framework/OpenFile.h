@@ -8,7 +8,7 @@ namespace KO {
 
 /**
  * Opens an ordinary file in a FileMode.
- * @throws FrameworkException when it cannot be opened or is no ordinary file
+ * @throws FrameworkException if it cannot be opened or is not an ordinary file
  */
 Agent::FileDescriptor openFile(const std::wstring& path, unsigned long mode);
 

@@ -4,7 +4,7 @@
 
 namespace KO {
 
-// The texts outlive the calls: the agent stays until the library goes.
+// The strings outlive the calls: the state is destroyed when the library is unloaded.
 const char* PlatformUtilities::getKelsaDirectory() {
     return agentState()->settings.installDirectory.c_str();
 }

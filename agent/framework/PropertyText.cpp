@@ -28,7 +28,7 @@ void appendByteEscape(std::string& text, char byte) {
     text += hexDigits[number & 15U];
 }
 
-/** @param alsoEscaped characters that would be misread at this place */
+/** @param alsoEscaped further characters to escape */
 std::string escape(const std::string& plain, std::string_view alsoEscaped) {
     std::string text;
     for (std::size_t index = 0; index < plain.size(); ++index) {
@@ -49,7 +49,7 @@ std::string escape(const std::string& plain, std::string_view alsoEscaped) {
     return text;
 }
 
-/** Decodes the escape at the head of a text. @return its length; 0 if there is none */
+/** Decodes the escape at the head of a string. @return its length; 0 if there is none */
 std::size_t decodeEscape(std::string_view text, char& byte) {
     if (text.size() < 2 || text[0] != '\\') {
         return 0;

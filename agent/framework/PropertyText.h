@@ -8,8 +8,8 @@
 namespace KO {
 
 /**
- * The text of a property file: lines "key=value", first line of a key counts. Blank lines, lines
- * that begin with '#' and lines without '=' are comments. Blanks around key and value do not count.
+ * The content of a property file: lines "key=value"; the first line of a key is used. Blank lines, lines that begin
+ * with '#' and lines without '=' are comments. Blanks around key and value are ignored.
  *
  * In keys and values a backslash is written \\, a line feed \n, a carriage return \r, and \xNN is
  * the byte with that hexadecimal number; so are written other control characters, blanks at the ends
@@ -19,13 +19,13 @@ class PropertyText {
 public:
     explicit PropertyText(std::string_view text = {});
 
-    /** The value of a key, if it is there. */
+    /** The value of a key, if the file has it. */
     std::optional<std::string> get(const std::string& key) const;
 
     /** Sets a key's value: in its line, or in a new one at the end. */
     void set(const std::string& key, const std::string& value);
 
-    /** The whole text; lines that were not set are as they were read. */
+    /** The complete content; lines of other keys are unchanged. */
     std::string text() const;
 
 private:

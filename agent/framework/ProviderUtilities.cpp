@@ -60,7 +60,7 @@ CMPIDateTime* makeDateTime(const CMPIBroker* broker, const std::string& text) {
     return cim::make<&CMPIBrokerEncFT::newDateTimeFromChars>(broker, text.c_str());
 }
 
-/** Hands a value over if there is one. @return whether there was */
+/** Assigns a value if there is one. @return whether there is one */
 template <typename Value>
 bool deliver(std::optional<Value> found, Value& value) {
     if (found) {
@@ -209,7 +209,7 @@ void ProviderUtilities::transformMonikerToObjectPath(Moniker& moniker, CMPIObjec
     if (path == nullptr) {
         return;
     }
-    Moniker cursor = moniker;  // the caller's selection stays as it is
+    Moniker cursor = moniker;  // keeps the caller's selection
     std::string name;
     std::string value;
     for (unsigned int index = 0; cursor.selectKey(index); ++index) {

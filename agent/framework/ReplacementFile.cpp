@@ -19,13 +19,13 @@ namespace {
     throwFileError("Cannot write ", path, errno);
 }
 
-/** A name beside the file that nobody would give another, so that one left behind by a crash can be told. */
+/** A distinct name in the file's directory, by which a file that a crash leaves behind can be recognized. */
 std::string temporaryNameFor(const std::string& target) {
     const std::size_t name = target.rfind('/') + 1;
     return target.substr(0, name) + "." + target.substr(name) + ".new-XXXXXX";
 }
 
-/** A new file beside the one to be replaced; removed again unless it took its place. */
+/** A new file in the directory of the file to replace; removed unless it has replaced that file. */
 class TemporaryFile {
 public:
     explicit TemporaryFile(const std::string& target)
@@ -43,7 +43,7 @@ public:
     TemporaryFile(const TemporaryFile&) = delete;
     TemporaryFile& operator=(const TemporaryFile&) = delete;
 
-    /** Takes over mode and owner of the file to be replaced. If that is gone, this one stays its owner's alone. */
+    /** Copies mode and owner of the file to replace. If that file is gone, only the owner has access. */
     void adoptAttributes(const std::string& target) {
         struct stat status {};
         if (::stat(target.c_str(), &status) != 0) {
@@ -71,7 +71,7 @@ public:
         }
     }
 
-    void takePlaceOf(const std::string& target) {
+    void replace(const std::string& target) {
         if (::rename(path.c_str(), target.c_str()) != 0) {
             fail(target);
         }
@@ -80,8 +80,8 @@ public:
 
 private:
     /**
-     * Only the superuser may give a file away; anybody else keeps it as its own, but may give it to a group of its own.
-     * @return whether the group is the one of before
+     * Only root may change the owner; other users may change the group to one of their groups.
+     * @return whether the file has the group of the replaced file
      */
     bool adoptOwners(const struct stat& status) {
         constexpr uid_t unchanged = static_cast<uid_t>(-1);
@@ -89,15 +89,14 @@ private:
                ::fchown(file.get(), unchanged, status.st_gid) == 0;
     }
 
-    /** What was the group's is nobody's, and everybody has no more than the group had, whose members now belong there.
-     */
+    /** Drops group permissions and limits "other" to the old group's, since its members are now "other". */
     static mode_t withoutGroup(mode_t mode) { return (mode & 0700U) | (mode & (mode >> 3U) & 07U); }
 
     std::string path;
     Agent::FileDescriptor file;
 };
 
-/** The file that a path leads to; the path itself if there is none. A link that cannot be followed is not replaced. */
+/** The file that a path resolves to; the path itself if there is none. Fails for a link that cannot be resolved. */
 std::string followLinks(const std::string& path) {
     std::error_code error;
     const std::filesystem::path target = std::filesystem::canonical(path, error);
@@ -107,7 +106,7 @@ std::string followLinks(const std::string& path) {
     return error ? path : target.string();
 }
 
-/** Forces the renaming to the disk. It has been done either way: a failure is no failure to replace. */
+/** Forces the renaming to the disk. Ignores failures, because the file has been replaced. */
 void syncDirectoryOf(const std::string& path) {
     const std::string directory = path.find('/') == std::string::npos ? "." : path.substr(0, path.rfind('/') + 1);
     const Agent::FileDescriptor file(::open(directory.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
@@ -123,7 +122,7 @@ void replaceFile(const std::string& path, const std::string& content) {
     TemporaryFile file(target);
     file.adoptAttributes(target);
     file.write(content);
-    file.takePlaceOf(target);
+    file.replace(target);
     syncDirectoryOf(target);
 }
 

@@ -5,12 +5,11 @@
 namespace KO {
 
 /**
- * Replaces a file's content as a whole: a temporary file in the same directory is written, forced to
- * the disk and renamed, so that a reader or a crash at any moment finds the old content or the new.
- * Mode, owner and group stay where the process may set them. Where it may not set the owner, the file becomes its own;
- * where it may not set the group, the new group is given no rights, and everybody at most those that the old one had.
- * A file that is not there gets mode 0600. A symbolic link stays one.
- * @throws FrameworkException when that fails; the old content then stands
+ * Replaces a file atomically: writes a temporary file in the same directory, forces it to the disk and renames it, so
+ * that readers find the old content or the new, also after a crash. Keeps mode, owner and group if the process may set
+ * them. If it may not set the owner, the process becomes the owner; if it may not set the group, the new group has no
+ * permissions, and others have at most those of the old group. A new file has mode 0600. A symbolic link is kept.
+ * @throws FrameworkException on failure; the file then has its old content
  */
 void replaceFile(const std::string& path, const std::string& content);
 

@@ -8,7 +8,7 @@ namespace KO {
 
 namespace {
 
-// A byte that is not UTF-8 becomes the lone surrogate 0xDC00 + byte, which no valid text holds.
+// A byte that is not UTF-8 becomes the lone surrogate 0xDC00 + byte, which no valid string contains.
 constexpr std::uint32_t firstByteCarrier = 0xDC80;
 constexpr std::uint32_t lastByteCarrier = 0xDCFF;
 constexpr std::uint32_t byteCarrierBase = 0xDC00;

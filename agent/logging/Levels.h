@@ -10,7 +10,7 @@ namespace RZLog {
 /** The two channels of the log. */
 enum class Channel { log, trace };
 
-/** The level up to which each channel takes records. */
+/** The highest level that each channel writes. */
 struct ChannelLevels {
     int log = 3000;
     int trace = 3000;
@@ -20,27 +20,27 @@ struct ChannelLevels {
 };
 
 /**
- * The levels of the loggers. Asking allocates nothing, takes no lock and works as long as the
- * library is mapped, whatever else of the process has been destroyed: hence the fixed sizes.
+ * The levels of the loggers. Reading them allocates nothing, takes no lock and works until the library is unloaded,
+ * also after static objects are destroyed: hence the fixed sizes.
  */
 class Levels {
 public:
     static constexpr std::size_t mostLoggers = 64;
     static constexpr std::size_t longestName = 127;
 
-    /** Sets the levels of all loggers that have none of their own. */
+    /** Sets the levels of all other loggers. */
     void setDefault(ChannelLevels levels) { fallback = levels; }
 
-    /** Sets one logger's levels. @return false when there is no room or the name is too long */
+    /** Sets one logger's levels. @return false if there is no room or the name is too long */
     bool set(std::string_view logger, ChannelLevels levels);
 
     /** The levels of a logger. */
     const ChannelLevels& of(std::string_view logger) const;
 
-    /** The highest level that any channel of any logger takes. */
+    /** The highest level that any channel of any logger writes. */
     int highest() const;
 
-    /** Whether a record of that level is to be written. */
+    /** Whether to write a record of that level. */
     bool admit(Channel channel, std::string_view logger, int level) const { return level <= of(logger).of(channel); }
 
 private:

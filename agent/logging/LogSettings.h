@@ -19,7 +19,7 @@ struct LogSettings {
     Levels levels;
 };
 
-/** Reads the [log] table; every value that is absent or wrong has its default. */
+/** Reads the [log] table; absent and wrong values have their defaults. */
 LogSettings readLogSettings(const Agent::Document& document, Agent::Problems& problems);
 
 }  // namespace RZLog

@@ -15,8 +15,8 @@ std::string_view orEmpty(const char* text) {
 }
 
 /**
- * Whoever logs an error of the system still wants to look at errno afterwards. And a thread that is cancelled goes on
- * until the record is written: the system unwinds it by what looks like an exception, and no catch may keep that.
+ * Keeps errno for the caller, and disables the cancellation of the thread while a record is written: cancellation
+ * unwinds the stack with an exception, which no catch may swallow.
  */
 class PreserveErrno {
 public:
@@ -42,7 +42,7 @@ void writeIfAdmitted(const Record& record) noexcept {
         if (record.level <= levelsOf(record.logger).of(record.channel)) {
             write(record);
         }
-    } catch (...) {  // the configuration did not fit into memory: the next call tries again
+    } catch (...) {  // out of memory while reading the configuration: the next call tries again
     }
 }
 
@@ -59,7 +59,7 @@ void RZLogger::traceLevelMessage(const char* function, const char* file, int lin
 }
 
 bool RZLogger::admits(const std::string& logger, int level) noexcept {
-    if (level > highestLevel()) {  // nearly always: most records are asked about, and never written
+    if (level > highestLevel()) {  // the usual case: most records are not written
         return false;
     }
     const PreserveErrno preserveErrno;

@@ -8,7 +8,7 @@ namespace RZLog {
 
 namespace {
 
-/** Appends everything that a stream puts out to a string. */
+/** Appends the output of a stream to a string. */
 class StringAppender : public std::streambuf {
 public:
     std::string text;
@@ -28,8 +28,8 @@ protected:
 };
 
 /**
- * Implementations waiting for their next buffer. No lock and nothing that a thread would have to
- * clean up: such a thing would keep the library in the process.
+ * Implementations for reuse. Has no lock and no thread-local data: destructors of the latter would keep the library
+ * from being unloaded.
  */
 template <typename Element, std::size_t Size>
 class Pool {
@@ -52,7 +52,7 @@ public:
         return nullptr;
     }
 
-    /** Keeps an element if there is a place for it. */
+    /** Stores an element if there is room. */
     void give(std::unique_ptr<Element> element) {
         for (std::atomic<Element*>& place : places) {
             Element* none = nullptr;
@@ -70,7 +70,7 @@ private:
 
 }  // namespace
 
-/** A stream is dear to make, and one is needed for every line that is traced: hence the pool. */
+/** Pooled, because constructing a stream for each trace line is expensive. */
 struct RZMessageBuffer::Implementation {
     StringAppender appender;
     std::ostream stream{&appender};
@@ -79,7 +79,7 @@ struct RZMessageBuffer::Implementation {
 
     Implementation() { stream.imbue(std::locale::classic()); }
 
-    /** Brings the stream back to the state of a new one, whatever was done to it. */
+    /** Resets the stream to the state of a new one. */
     void resetStream() {
         stream.exceptions(std::ios_base::goodbit);
         stream.rdbuf(&appender);  // clears the error state too

@@ -8,10 +8,10 @@
 
 namespace RZLog {
 
-/** The logger of the agent's own libraries. */
+/** The logger of the agent's libraries. */
 constexpr const char* ownLogger = "Ostrel.Agent";
 
-/** One record on its way to the log. The texts are borrowed. */
+/** One record. Does not own its strings. */
 struct Record {
     Channel channel = Channel::log;
     int level = 0;
@@ -22,16 +22,16 @@ struct Record {
     std::string_view text;
 };
 
-/** The record's line in a log file, without line end: eight fields, tabs between them. */
+/** The record's line in a log file, without line end: eight fields, separated by tabs. */
 std::string fileLine(const Record& record, std::chrono::system_clock::time_point time);
 
-/** The record's text for a log that keeps the time itself. One line. */
+/** The record's line in a system log, which adds the time itself. */
 std::string systemLogLine(const Record& record);
 
 /**
- * Appends a field to a line so that no content can pass for a field's or a record's end. Tab, line
- * feed, carriage return and backslash become \t, \n, \r and \\; every byte of another control
- * character, and every byte that is not part of valid UTF-8, becomes \xNN.
+ * Appends a field to a line, escaped so that no content ends the field or the record. Tab, line feed, carriage return
+ * and backslash become \t, \n, \r and \\; each byte of another control character, and each byte that is not part of
+ * valid UTF-8, becomes \xNN.
  */
 void appendEscaped(std::string& line, std::string_view field);
 

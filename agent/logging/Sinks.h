@@ -7,7 +7,7 @@
 
 namespace RZLog {
 
-/** Where records go. Its writing may throw; it is not safe for several threads. */
+/** Writes records to a destination. Not thread-safe. */
 class Sink {
 public:
     Sink() = default;
@@ -15,14 +15,14 @@ public:
     Sink& operator=(const Sink&) = delete;
     virtual ~Sink() = default;
 
-    /** Writes one record, so that it survives the process from here on. */
+    /** Writes one record, which then survives the process. @throws std::exception on failure */
     virtual void write(const Record& record) = 0;
 };
 
 /**
  * Opens the destination of the settings.
- * @return null when there is none
- * @throws std::exception when it cannot be opened
+ * @return null if there is none
+ * @throws std::exception if it cannot be opened
  */
 std::unique_ptr<Sink> openSink(const LogSettings& settings);
 

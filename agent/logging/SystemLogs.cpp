@@ -29,7 +29,7 @@ public:
         path.copy(address.sun_path, sizeof address.sun_path - 1);
     }
 
-    /** Not connected: so a service that was started anew is found. @return whether it was taken */
+    /** Not connected, so that a restarted service receives the datagram. @return whether it was sent */
     bool send(const std::string& content) const {
         return ::sendto(descriptor.get(), content.data(), content.size(), MSG_NOSIGNAL | MSG_DONTWAIT,
                         reinterpret_cast<const sockaddr*>(&address), sizeof address) >= 0;
@@ -51,16 +51,16 @@ std::string cut(std::string text) {
     return text;
 }
 
-/** A message to the service about one line, of LOG_ERR or LOG_DEBUG. */
+/** Formats a line as message to the service, with priority LOG_ERR or LOG_DEBUG. */
 using Form = std::string (*)(int priority, const std::string& line);
 
 class DatagramSink : public Sink {
 public:
-    DatagramSink(const std::string& socketPath, Form itsForm, bool itTells)
-        : service(socketPath), form(itsForm), tells(itTells) {}
+    DatagramSink(const std::string& socketPath, Form itsForm, bool itReports)
+        : service(socketPath), form(itsForm), reportsLosses(itReports) {}
 
     void write(const Record& record) override {
-        if (!(tellOfDropped() && send(record))) {
+        if (!(reportDropped() && send(record))) {
             ++dropped;
         }
     }
@@ -70,13 +70,13 @@ private:
         return service.send(form(record.level <= errorLevel ? LOG_ERR : LOG_DEBUG, cut(systemLogLine(record))));
     }
 
-    /** @return whether nothing is left to tell */
-    bool tellOfDropped() {
+    /** @return whether nothing is left to report */
+    bool reportDropped() {
         if (dropped == 0) {
             return true;
         }
         const std::string text = std::to_string(dropped) + " records were lost: the log's service did not take them";
-        if (tells && !send({Channel::log, errorLevel, ownLogger, "write", "SystemLogs.cpp", __LINE__, text})) {
+        if (reportsLosses && !send({Channel::log, errorLevel, ownLogger, "write", "SystemLogs.cpp", __LINE__, text})) {
             return false;
         }
         dropped = 0;
@@ -85,11 +85,11 @@ private:
 
     DatagramSocket service;
     Form form;
-    bool tells;
+    bool reportsLosses;
     unsigned long dropped = 0;
 };
 
-/** As syslog(3) has it where the process did not call openlog(3). */
+/** The format of syslog(3) in a process that has not called openlog(3). */
 std::string systemLogMessage(int priority, const std::string& line) {
     const std::time_t now = std::time(nullptr);
     std::tm fields{};
@@ -102,14 +102,14 @@ std::string systemLogMessage(int priority, const std::string& line) {
     return "<" + std::to_string(LOG_DAEMON | priority) + ">" + time + " " + program_invocation_short_name + ": " + line;
 }
 
-/** The journal's own protocol; a line has no line end in it. */
+/** The journal's native protocol; a line contains no line end. */
 std::string journalMessage(int priority, const std::string& line) {
     return "MESSAGE=" + line + "\nPRIORITY=" + std::to_string(priority) + "\nSYSLOG_IDENTIFIER=ostrel-agent\n";
 }
 
 std::unique_ptr<Sink> open(const LogSettings& settings, const std::string& socketPath, Form form) {
-    const bool tells = settings.levels.admit(Channel::log, ownLogger, errorLevel);
-    return std::make_unique<DatagramSink>(socketPath, form, tells);
+    const bool reportsLosses = settings.levels.admit(Channel::log, ownLogger, errorLevel);
+    return std::make_unique<DatagramSink>(socketPath, form, reportsLosses);
 }
 
 }  // namespace

@@ -8,14 +8,14 @@
 namespace RZLog {
 
 /**
- * The sinks of the system log and of systemd's journal. Each sends a datagram a record to the service's socket, itself:
- * the functions that libraries have for it wait for a service that does not read. A record that the service does not
- * take at once, or that finds none, is dropped. They are counted, and told of before the next record that is taken.
- * What is longer than longestText is cut there.
+ * The sinks of the system log and of systemd's journal. Each sends one datagram per record to the service's socket.
+ * They do not use syslog(3) or sd_journal_send(3), which block while the service does not read. A record that the
+ * service does not receive at once is dropped. Dropped records are counted, and the count is reported before the next
+ * record that is sent. Longer records are truncated to longestText.
  *
- * @param settings say whether the library's own logger is to tell of it
- * @param socketPath the service's socket, which is looked for with each record
- * @throws std::system_error when this process can have no socket
+ * @param settings   the levels, which decide whether the library's own logger reports dropped records
+ * @param socketPath the service's socket, looked up for each record
+ * @throws std::system_error if no socket can be created
  */
 ///@{
 std::unique_ptr<Sink> openSystemLog(const LogSettings& settings, const std::string& socketPath = "/dev/log");
@@ -23,7 +23,7 @@ std::unique_ptr<Sink> openJournal(const LogSettings& settings,
                                   const std::string& socketPath = "/run/systemd/journal/socket");
 ///@}
 
-/** Bytes of a record's text that surely fit into a datagram. */
+/** The most bytes of a record that a datagram is sure to hold. */
 constexpr std::size_t longestText = 100000;
 
 }  // namespace RZLog

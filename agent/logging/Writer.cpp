@@ -17,15 +17,15 @@ constexpr std::chrono::seconds pauseAfterFailure{10};
 
 std::atomic<int> ceiling{std::numeric_limits<int>::max()};
 
-/** The destination and what it is opened with. */
+/** The destination and its settings. */
 struct Output {
     LogSettings settings;
     std::unique_ptr<Sink> sink;
     std::chrono::steady_clock::time_point nextOpening = std::chrono::steady_clock::time_point::min();
 };
 
-// A thread may still log while the process ends and static objects go: what it touches then is the
-// mutex and the pointer, which need no destruction.
+// A thread may log while static objects are destroyed at exit. It uses only the mutex and the pointer then, which need
+// no destruction.
 std::mutex outputMutex;
 Output* output = nullptr;
 
@@ -67,7 +67,7 @@ void reportProblems(const Agent::Problems& problems, const Levels& levels) {
     }
 }
 
-/** Admits nothing, so that those who ask first do not make up what nobody will read. */
+/** Admits nothing, so that callers do not format records that are not written. */
 Levels silence() {
     constexpr int lowest = std::numeric_limits<int>::min();
     Levels levels;
@@ -97,7 +97,7 @@ Levels configure() {
 }  // namespace
 
 const ChannelLevels& levelsOf(std::string_view logger) {
-    static_assert(std::is_trivially_destructible_v<Levels>, "levels are asked for while the process ends");
+    static_assert(std::is_trivially_destructible_v<Levels>, "levels are read while static objects are destroyed");
     static const Levels levels = configure();
     return levels.of(logger);
 }

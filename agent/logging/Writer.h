@@ -5,17 +5,17 @@
 namespace RZLog {
 
 /**
- * The levels up to which the channels write a logger's records. The first call in the process reads the configuration.
- * Where it names no destination, nothing is written.
+ * The highest levels that the channels write for a logger. The first call in the process reads the configuration. If it
+ * has no destination, nothing is written.
  */
 const ChannelLevels& levelsOf(std::string_view logger);
 
-/** The highest level of all that levelsOf gives; the highest there is while the configuration has not been read. */
+/** The highest level that levelsOf returns for any logger; the maximum until the configuration is read. */
 int highestLevel() noexcept;
 
 /**
- * Writes a record to the configured destination. A destination that fails loses the record and is
- * opened anew some seconds later. After the library's static objects have gone, records are dropped.
+ * Writes a record to the configured destination. If that fails, drops the record and reopens the destination some
+ * seconds later. Drops records after the library's static objects are destroyed.
  */
 void write(const Record& record) noexcept;
 

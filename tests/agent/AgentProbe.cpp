@@ -1,5 +1,5 @@
-// A process that uses the agent's libraries under the configuration of its environment and says what
-// it finds. First argument: what to do.
+// A process that uses the agent's libraries with the configuration of its environment and prints what they return. The
+// first argument is the action.
 
 #include "KO/Instrumentation.h"
 #include "KO/PlatformUtilities.h"
@@ -31,7 +31,7 @@ void log(int level, const std::string& logger, const std::string& text) {
     }
 }
 
-/** probe admits LEVEL LOGGER: says whether the log would take such a record, before it has written one and after. */
+/** probe admits LEVEL LOGGER: prints whether the log admits such a record, before and after writing one. */
 void sayWhetherAdmitted(int level, const std::string& logger) {
     const auto say = [&] { std::cout << (RZLog::RZLogger::admits(logger, level) ? "yes" : "no") << std::endl; };
     say();
@@ -39,7 +39,7 @@ void sayWhetherAdmitted(int level, const std::string& logger) {
     say();
 }
 
-/** probe many THREADS RECORDS: numbered records from several threads at a time. */
+/** probe many THREADS RECORDS: numbered records from concurrent threads. */
 void logMany(int threadCount, int recordCount) {
     std::vector<std::thread> threads;
     threads.reserve(static_cast<std::size_t>(threadCount));
@@ -56,7 +56,7 @@ void logMany(int threadCount, int recordCount) {
     }
 }
 
-/** probe show: what the framework says of the agent and of the managed system. */
+/** probe show: prints the framework's values of the agent and of the managed system. */
 void show() {
     std::cout << KO::PlatformUtilities::getKelsaDirectory() << '\n'
               << KO::PlatformUtilities::getKelsaDataDir() << '\n'
@@ -73,7 +73,7 @@ void show() {
     }
 }
 
-/** probe limited: logs while no file may grow beyond a few bytes, and then while it may again. */
+/** probe limited: logs while files are limited to a few bytes, and again without the limit. */
 void logToAFullDisk() {
     std::signal(SIGXFSZ, SIG_IGN);
     rlimit limit{};

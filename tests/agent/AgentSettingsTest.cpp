@@ -40,7 +40,7 @@ TEST_F(AgentSettingsTest, HaveDefaults) {
     EXPECT_THAT(problems, IsEmpty());
 }
 
-TEST_F(AgentSettingsTest, HaveTheDefaultsThatTheInstalledFileShows) {
+TEST_F(AgentSettingsTest, HaveTheDefaultsOfTheInstalledFile) {
     const AgentSettings defaults = read("");
     const AgentSettings shown = read(shippedConfiguration().c_str());
     EXPECT_EQ(shown.installDirectory, defaults.installDirectory);
@@ -56,7 +56,7 @@ TEST_F(AgentSettingsTest, HaveTheDefaultsThatTheInstalledFileShows) {
     EXPECT_THAT(problems, IsEmpty());
 }
 
-TEST_F(AgentSettingsTest, DeriveTheIdentifyingNumberFromTheMachineWithoutGivingTheMachineIdAway) {
+TEST_F(AgentSettingsTest, DeriveTheIdentifyingNumberWithoutRevealingTheMachineId) {
     const std::string number = read("").product.identifyingNumber;
     EXPECT_THAT(number, MatchesRegex("unknown|[0-9a-f]{32}"));
     EXPECT_EQ(number, read("").product.identifyingNumber);
@@ -70,7 +70,7 @@ TEST_F(AgentSettingsTest, EndDirectoriesWithASeparator) {
     EXPECT_THAT(problems, IsEmpty());
 }
 
-TEST_F(AgentSettingsTest, RefuseDirectoriesThatAreNoAbsolutePaths) {
+TEST_F(AgentSettingsTest, RejectRelativeDirectories) {
     const AgentSettings settings = read("[directories]\ninstall = 'agent'\ndata = ''\n");
     EXPECT_EQ(settings.installDirectory, "/usr/lib/ostrel/");
     EXPECT_EQ(settings.dataDirectory, "/var/lib/ostrel/");
@@ -78,7 +78,7 @@ TEST_F(AgentSettingsTest, RefuseDirectoriesThatAreNoAbsolutePaths) {
                                       "configuration key directories.data must not be empty; ignored"));
 }
 
-TEST_F(AgentSettingsTest, TakeTheProduct) {
+TEST_F(AgentSettingsTest, ReadTheProduct) {
     const AgentSettings settings = read(
         "[product]\nname = 'A'\nversion = '2.0.0'\nbuild_number = '7'\nidentifying_number = 'N-1'\nvendor = 'V'\n");
     EXPECT_EQ(settings.product.name, "A");
@@ -89,12 +89,12 @@ TEST_F(AgentSettingsTest, TakeTheProduct) {
     EXPECT_THAT(problems, IsEmpty());
 }
 
-TEST_F(AgentSettingsTest, KeepTheProductsTextsFromBeingEmpty) {
+TEST_F(AgentSettingsTest, RejectEmptyProductValues) {
     EXPECT_EQ(read("[product]\nvendor = ''\n").product.vendor, "VEL");
     EXPECT_THAT(problems, ElementsAre("configuration key product.vendor must not be empty; ignored"));
 }
 
-TEST_F(AgentSettingsTest, TakeNodes) {
+TEST_F(AgentSettingsTest, ReadNodes) {
     const AgentSettings settings = read(R"(
 [instrumentation]
 dmi_root = "/tmp/dmi"
@@ -119,7 +119,7 @@ path = "x"
     EXPECT_THAT(settings.nodes[1].properties, IsEmpty());
 }
 
-TEST_F(AgentSettingsTest, LeaveOutNodesWithoutTypeOrPath) {
+TEST_F(AgentSettingsTest, SkipNodesWithoutTypeOrPath) {
     const AgentSettings settings = read(R"(
 [[instrumentation.node]]
 path = "/no/type"
@@ -137,7 +137,7 @@ path = "/bad/type"
                             "ignored"));
 }
 
-TEST_F(AgentSettingsTest, LeaveOutPropertiesThatAreNotANumberWithAText) {
+TEST_F(AgentSettingsTest, SkipPropertiesWithoutANumberOrAString) {
     const AgentSettings settings = read(R"(
 [[instrumentation.node]]
 type = 1
@@ -148,12 +148,12 @@ properties = { name = "a", "65536" = "b", "10" = 3, "-1" = "c", "12x" = "d", "11
     EXPECT_THAT(settings.nodes[0].properties, ElementsAre(Pair(11U, "good")));
     const std::string key = "configuration key instrumentation.node[0].properties.";
     EXPECT_THAT(problems, testing::UnorderedElementsAre(
-                              key + "name is no property number; ignored", key + "65536 is no property number; ignored",
-                              key + "10 must be a string; ignored", key + "-1 is no property number; ignored",
-                              key + "12x is no property number; ignored"));
+                              key + "name is not a property number; ignored", key + "65536 is no property number; ignored",
+                              key + "10 must be a string; ignored", key + "-1 is not a property number; ignored",
+                              key + "12x is not a property number; ignored"));
 }
 
-TEST_F(AgentSettingsTest, NoteUnknownKeysButNotTheLogs) {
+TEST_F(AgentSettingsTest, ReportUnknownKeysOutsideOfTheLogTable) {
     read("color = 1\n[log]\nanything = 1\n[directories]\nlogs = '/x'\n[product]\nid = 'x'\n[instrumentation]\nx = 1\n");
     EXPECT_THAT(problems, ElementsAre("configuration key directories.logs is unknown; ignored",
                                       "configuration key product.id is unknown; ignored",
@@ -161,7 +161,7 @@ TEST_F(AgentSettingsTest, NoteUnknownKeysButNotTheLogs) {
                                       "configuration key color is unknown; ignored"));
 }
 
-TEST_F(AgentSettingsTest, KeepTheSwitchesThatAreSetByTableAndKey) {
+TEST_F(AgentSettingsTest, ReadFlagsByTableAndKey) {
     EXPECT_THAT(read("").flags, IsEmpty());
     EXPECT_THAT(read("[gate]\nrefuse_lossy_values = false\n").flags,
                 ElementsAre(Pair("gate.refuse_lossy_values", false)));

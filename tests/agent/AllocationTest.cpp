@@ -36,7 +36,7 @@ protected:
 
 }  // namespace
 
-TEST_F(Allocation, IsCountedInTheLibraryToo) {
+TEST_F(Allocation, IsAlsoCountedInTheLibrary) {
     const long before = allocations;
     { const RZLog::RZMessageBuffer buffer; }
     EXPECT_GT(allocations, before) << "the first buffer must be made";
@@ -55,7 +55,7 @@ TEST_F(Allocation, IsNotNeededForARecordThatIsNotAdmitted) {
     EXPECT_EQ(allocations, before);
 }
 
-TEST_F(Allocation, IsNotNeededForABufferAfterOthers) {
+TEST_F(Allocation, IsNotNeededForAReusedBuffer) {
     const auto useBuffer = [] {
         RZLog::RZMessageBuffer buffer;
         buffer << "a text that does not fit into a string object";

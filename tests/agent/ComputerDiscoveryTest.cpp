@@ -56,13 +56,13 @@ TEST_F(ComputerDiscoveryTest, ReadsVendorModelAndChassis) {
     EXPECT_THAT(problems, IsEmpty());
 }
 
-TEST_F(ComputerDiscoveryTest, LeavesNoDashInTheModelBecauseReadersCutThere) {
+TEST_F(ComputerDiscoveryTest, RemovesDashesFromTheModel) {
     dmi.write("product_name", "X-200-Pro -  rev-B\n");
     dmi.write("chassis_type", "10\n");
     EXPECT_EQ(computer().at(productProperty), "X 200 Pro rev B - Notebook");
 }
 
-TEST_F(ComputerDiscoveryTest, KnowsTheWordsForChassisTypes) {
+TEST_F(ComputerDiscoveryTest, NamesChassisTypes) {
     const std::map<std::string, std::string> words = {
         {"3", "Desktop"},   {"9", "Laptop"},    {"17", "Main Server Chassis"},
         {"36", "Stick PC"}, {"137", "Laptop"},  // with the lock bit
@@ -77,7 +77,7 @@ TEST_F(ComputerDiscoveryTest, KnowsTheWordsForChassisTypes) {
     EXPECT_THAT(problems, IsEmpty());
 }
 
-TEST_F(ComputerDiscoveryTest, TakesWhatCarelessFirmwareSaysForNothing) {
+TEST_F(ComputerDiscoveryTest, TreatsFirmwarePlaceholdersAsAbsent) {
     for (const char* text : {"To Be Filled By O.E.M.", "TO BE FILLED BY O.E.M.", "System manufacturer", "Not Specified",
                              "None", "Default string", "   ", "", "System Product Name"}) {
         dmi.write("sys_vendor", std::string(text) + "\n");
@@ -87,24 +87,24 @@ TEST_F(ComputerDiscoveryTest, TakesWhatCarelessFirmwareSaysForNothing) {
     }
 }
 
-TEST_F(ComputerDiscoveryTest, FallsBackWhenTheModelIsNothingButDashes) {
+TEST_F(ComputerDiscoveryTest, ReplacesAModelOfDashesOnly) {
     dmi.write("product_name", "---\n");
     EXPECT_EQ(computer().at(productProperty), "Computer - Computer");
 }
 
-TEST_F(ComputerDiscoveryTest, TakesAModelForNothingThatSaysNothingWithoutItsDashes) {
+TEST_F(ComputerDiscoveryTest, ReplacesAModelThatIsAPlaceholderWithoutItsDashes) {
     for (const char* text : {"none-", "-- Unknown", "to-be-filled-by-o.e.m."}) {
         dmi.write("product_name", std::string(text) + "\n");
         EXPECT_EQ(computer().at(productProperty), "Computer - Computer") << text;
     }
 }
 
-TEST_F(ComputerDiscoveryTest, MakesBlanksOfBytesThatAreNoText) {
+TEST_F(ComputerDiscoveryTest, ReplacesInvalidBytesByBlanks) {
     dmi.write("sys_vendor", "Caf\xC3\xA9 \xFF\xFF Ltd\x01\n");
     EXPECT_EQ(computer().at(vendorProperty), "Caf\xC3\xA9 Ltd");
 }
 
-TEST_F(ComputerDiscoveryTest, NotesAFileThatIsThereAndCannotBeRead) {
+TEST_F(ComputerDiscoveryTest, ReportsUnreadableFiles) {
     std::filesystem::create_directory(dmi.file("product_name"));
     EXPECT_EQ(computer().at(productProperty), "Computer - Computer");
     EXPECT_THAT(problems, ElementsAre(dmi.file("product_name") + " cannot be read: Is a directory"));

@@ -35,7 +35,7 @@ protected:
 
 }  // namespace
 
-TEST_F(ConfigurationInProcess, MayBeMissingAltogether) {
+TEST_F(ConfigurationInProcess, MayBeMissing) {
     const ProbeResult result = runProbe(directory.file("none.toml"), {"show"});
     EXPECT_EQ(result.exitCode, 0);
     EXPECT_EQ(result.errors, "");
@@ -43,7 +43,7 @@ TEST_F(ConfigurationInProcess, MayBeMissingAltogether) {
     EXPECT_THAT(result.output, HasSubstr("/system/computer " + hostName() + " "));
 }
 
-TEST_F(ConfigurationInProcess, LeadsToTheFirmwareFiles) {
+TEST_F(ConfigurationInProcess, SetsTheDirectoryOfFirmwareFiles) {
     std::filesystem::create_directory(directory.file("dmi"));
     directory.write("dmi/product_name", "X-200\n");
     directory.write("dmi/chassis_type", "9\n");
@@ -72,7 +72,7 @@ properties = { "39" = "Model X - Tower" }
                                   "/second host2 (none)\n"));
 }
 
-TEST_F(ConfigurationInProcess, MayLeaveNothingOfWhatWasDiscovered) {
+TEST_F(ConfigurationInProcess, MayDisableDiscovery) {
     EXPECT_THAT(show("[instrumentation]\ndiscover = false\n"), Not(HasSubstr("/system")));
 }
 
@@ -86,21 +86,21 @@ TEST_F(ConfigurationInProcess, ProblemsAreReportedOnceAndTheRestIsUsed) {
     EXPECT_EQ(std::count(log.begin(), log.end(), '\n'), 2);
 }
 
-TEST_F(ConfigurationInProcess, OfAFirmwareFileThatCannotBeReadIsReported) {
+TEST_F(ConfigurationInProcess, UnreadableFirmwareFilesAreReported) {
     std::filesystem::create_directories(directory.file("dmi/sys_vendor"));
     show("[instrumentation]\ndmi_root = '" + directory.file("dmi") + "'\n");
     EXPECT_THAT(directory.read("agent.log"), HasSubstr("\tOstrel.Agent\t"));
     EXPECT_THAT(directory.read("agent.log"), HasSubstr("/dmi/sys_vendor cannot be read: Is a directory\n"));
 }
 
-TEST_F(ConfigurationInProcess, ThatIsNoTomlLeavesTheDefaults) {
+TEST_F(ConfigurationInProcess, InvalidTomlLeavesTheDefaults) {
     const ProbeResult result = runProbe(directory.write("agent.toml", "[directories\n"), {"show"});
     EXPECT_EQ(result.exitCode, 0);
     EXPECT_EQ(result.errors, "");
     EXPECT_THAT(result.output, HasSubstr("/usr/lib/ostrel/\n/var/lib/ostrel/\n"));
 }
 
-TEST_F(ConfigurationInProcess, StaysUsableWhileStaticObjectsGo) {
+TEST_F(ConfigurationInProcess, IsUsableWhileStaticObjectsAreDestroyed) {
     const std::string settings =
         "[directories]\ndata = '/srv/agent'\n[log]\ndestination = '" + directory.file("agent.log") + "'\n";
     const ProbeResult result = runProbe(directory.write("agent.toml", settings), {"exit"});

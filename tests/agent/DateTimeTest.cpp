@@ -24,21 +24,21 @@ TEST(DateTime, IsNoDateAtFirst) {
     EXPECT_EQ(Utils::convertCIMDateTime(DateTime()), noDate);
 }
 
-TEST(DateTime, ComesBackExactlyAsItsTextWas) {
+TEST(DateTime, KeepsItsString) {
     for (const char* text : {"20240229123456.000789-330", "19700101000000.000000+000", "20240101000000.999999-000",
                              "99991231235959.000000+999", "00000101000000.000000+720"}) {
         EXPECT_EQ(thereAndBack(text), text);
     }
 }
 
-TEST(DateTime, IsNoDateWhenTheTextIsNone) {
+TEST(DateTime, IsNoDateIfTheStringIsInvalid) {
     for (const char* text : {"", "00000000000000.000000-000", "20230229000000.000000+000", "2024-02-29",
                              "20240229250000.000000+000", "00000010120000.000000:000"}) {
         EXPECT_EQ(thereAndBack(text), noDate) << text;
     }
 }
 
-TEST(DateTime, OfTheClockIsUtcUnlessLocalTimeIsAskedFor) {
+TEST(DateTime, OfTheClockIsUtcUnlessLocalTimeIsRequested) {
     ::setenv("TZ", "EAST-05:45", 1);
     ::tzset();
     EXPECT_EQ(Utils::convertCIMDateTime(DateTime(1700000000, 3)), "20231115035820.000000+345");
@@ -52,7 +52,7 @@ TEST(DateTime, OfTheClockIsUtcUnlessLocalTimeIsAskedFor) {
     ::tzset();
 }
 
-TEST(DateTime, OfAClockThatIsFarOffIsNoDate) {
+TEST(DateTime, OutOfRangeSecondsAreNoDate) {
     EXPECT_EQ(Utils::convertCIMDateTime(DateTime(INT64_MAX, 3)), noDate);
     EXPECT_EQ(Utils::convertCIMDateTime(DateTime(INT64_MIN, 0)), noDate);
 }

@@ -26,28 +26,28 @@ TEST(Document, IsReadFromAFile) {
     EXPECT_EQ(nameIn(document), "x");
 }
 
-TEST(Document, IsEmptyAndNoProblemWhenTheFileIsAbsent) {
+TEST(Document, IsEmptyWithoutAProblemIfTheFileIsAbsent) {
     const TemporaryDirectory directory;
     const Document document = Document::read(directory.file("agent.toml"));
     EXPECT_EQ(document.problem(), "");
     EXPECT_EQ(nameIn(document), std::nullopt);
 }
 
-TEST(Document, IsEmptyWithAProblemWhenTheFileCannotBeRead) {
+TEST(Document, IsEmptyWithAProblemIfTheFileCannotBeRead) {
     const TemporaryDirectory directory;
     const Document document = Document::read(directory.path());
     EXPECT_EQ(document.problem(), directory.path() + " cannot be read (Is a directory); using the defaults");
     EXPECT_EQ(nameIn(document), std::nullopt);
 }
 
-TEST(Document, IsEmptyWithAProblemThatNamesTheLineWhenItIsNoToml) {
+TEST(Document, ReportsTheLineOfInvalidToml) {
     const Document document = Document::parse("name = 'x'\n= nonsense\n", "agent.toml");
     EXPECT_THAT(document.problem(), StartsWith("agent.toml is not valid TOML (line 2: "));
     EXPECT_THAT(document.problem(), HasSubstr("using the defaults"));
     EXPECT_EQ(nameIn(document), std::nullopt);
 }
 
-TEST(Document, IsNoTomlWithCharactersOutsideOfAsciiOutsideOfStringsAndComments) {
+TEST(Document, RejectsNonAsciiOutsideOfStringsAndComments) {
     for (const char* text : {"n\xC3\xA4me = 1\n", "name = 1 \xD2\x97\n", "\xE2\x80\x80name = 1\n", "name = \xFF\n",
                              "name = 'x' \xC2\xA0# y\n", "name = \"\"\"x\"\"\"\xC3\xA4\n", "name = '''x'''\xC3\xA4\n",
                              "name = 2\"\xC3\xA4\"", "name = 2 '\xC3\xA4'\n"}) {
@@ -57,7 +57,7 @@ TEST(Document, IsNoTomlWithCharactersOutsideOfAsciiOutsideOfStringsAndComments) 
     }
 }
 
-TEST(Document, MayHaveAnyCharactersInStringsAndComments) {
+TEST(Document, AcceptsAnyCharacterInStringsAndComments) {
     for (const char* text :
          {"name = \"\xC3\xA4\"", "name = '\xC3\xA4'", "name = \"\"\"\n\xC3\xA4\"\"\"", "name = '''\n\xC3\xA4'''",
           "# \xD2\x97 \"\n\"n\\u0061me\" = \"\xC3\xA4\" # '\xC3\xA4", "\xEF\xBB\xBFname = \"\\u00e4\"",
@@ -84,7 +84,7 @@ TEST(Document, RejectsUnknownEscapesAndValuesThatDoNotEnd) {
     }
 }
 
-TEST(Document, MayHaveAllKindsOfValuesAndKeys) {
+TEST(Document, AcceptsAllKindsOfValuesAndKeys) {
     const char* text =
         "name = 'x'\n[table.\"quoted\"]\n[[\"tables\".x]]\n'key' = 1\n[more]\n"
         "array = [ 1,2 ,[ 'a',\"b\" ], {c = 'd',e='f'},\n 3 # '=[\n, 'g' ]\n"
@@ -94,7 +94,7 @@ TEST(Document, MayHaveAllKindsOfValuesAndKeys) {
     EXPECT_EQ(nameIn(document), "x");
 }
 
-TEST(Document, MayHaveAnyCharacterBehindABackslashThatIsNoEscape) {
+TEST(Document, AcceptsAnyCharacterAfterABackslashInLiteralStrings) {
     const Document document = Document::parse("name = '\\\xC3\xA4' # \\\xC3\xA4", "");
     EXPECT_EQ(document.problem(), "");
     EXPECT_EQ(nameIn(document), "\\\xC3\xA4");

@@ -11,7 +11,7 @@ using Agent::FileContent;
 using Agent::readFile;
 using agent_test::TemporaryDirectory;
 
-TEST(FileContent, ReadsAWholeFile) {
+TEST(FileContent, ReadsACompleteFile) {
     const TemporaryDirectory directory;
     const std::string text = std::string(100000, 'x') + '\0' + "end";
     const FileContent content = readFile(directory.write("file", text));
@@ -19,7 +19,7 @@ TEST(FileContent, ReadsAWholeFile) {
     EXPECT_EQ(content.text, text);
 }
 
-TEST(FileContent, TellsAbsentFromUnreadable) {
+TEST(FileContent, DistinguishesAbsentFromUnreadable) {
     const TemporaryDirectory directory;
     EXPECT_TRUE(readFile(directory.file("nothing")).absent());
     EXPECT_TRUE(readFile(directory.write("file", "") + "/below").absent());
@@ -29,17 +29,17 @@ TEST(FileContent, TellsAbsentFromUnreadable) {
     EXPECT_FALSE(ofDirectory.absent());
 }
 
-TEST(FileContent, DoesNotWaitForThePartnerOfAPipe) {
+TEST(FileContent, DoesNotWaitForTheOtherEndOfAPipe) {
     const TemporaryDirectory directory;
     ASSERT_EQ(::mkfifo(directory.file("pipe").c_str(), 0600), 0);
     EXPECT_EQ(readFile(directory.file("pipe")).text, "");
 }
 
-TEST(FileContent, RefusesAFileWithoutEnd) {
+TEST(FileContent, RejectsAFileWithoutEnd) {
     EXPECT_EQ(readFile("/dev/zero").error, EFBIG);
 }
 
-TEST(FileContent, RefusesAPathWithANulCharacter) {
+TEST(FileContent, RejectsAPathWithANulCharacter) {
     const TemporaryDirectory directory;
     directory.write("file", "content");
     EXPECT_EQ(readFile(directory.file("file") + '\0' + "more").error, EINVAL);

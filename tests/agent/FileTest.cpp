@@ -18,7 +18,7 @@ using KO::make_wstring;
 
 namespace {
 
-/** The text of the exception that opening throws; empty when it throws none. */
+/** The message of the exception that opening throws; empty if it throws none. */
 std::string failureOfOpening(const std::string& path, unsigned long mode) {
     try {
         File file(make_wstring(path));
@@ -46,7 +46,7 @@ TEST(File, IsCreatedEmptyByOpeningForWriting) {
     EXPECT_EQ(status.st_mode & 07137U, 0U) << "no rights for others, none to execute";
 }
 
-TEST(File, IsForItsOwnerAndGroupAsFarAsTheUmaskLetsThem) {
+TEST(File, HasMode0640LessTheUmask) {
     for (const auto& [mask, mode] :
          {std::pair(mode_t{0}, 0640U), std::pair(mode_t{027}, 0640U), std::pair(mode_t{077}, 0600U)}) {
         const testsupport::Umask umask(mask);
@@ -81,14 +81,14 @@ TEST(File, MustNotBeADirectory) {
     }
 }
 
-TEST(File, MustBeAnOrdinaryFileAndIsNotWaitedFor) {
+TEST(File, MustBeAnOrdinaryFile) {
     const TemporaryDirectory directory;
     ASSERT_EQ(::mkfifo(directory.file("pipe").c_str(), 0600), 0);
     EXPECT_NE(failureOfOpening(directory.file("pipe"), 1), "");
     EXPECT_NE(failureOfOpening(directory.file("pipe"), 3), "");
 }
 
-TEST(File, RefusesModesAndPathsThatMeanNothing) {
+TEST(File, RejectsInvalidModesAndPaths) {
     const TemporaryDirectory directory;
     const std::string path = directory.write("file", "");
     for (const unsigned long mode : {0UL, 2UL, 4UL, 0xFFFFFFFFUL}) {
@@ -118,7 +118,7 @@ TEST(File, MayHaveANameThatIsNotUtf8) {
     EXPECT_TRUE(std::filesystem::exists(directory.file("caf\xE9")));
 }
 
-TEST(FilePath, KeepsItsTextInEveryCopy) {
+TEST(FilePath, KeepsItsValueInEveryCopy) {
     const File::Path path(L"/some/file");
     const File::Path copy = path;
     File::Path assigned(L"");

@@ -27,7 +27,7 @@ std::vector<std::string> pathsOf(NodeType type) {
 
 }  // namespace
 
-TEST(Instrumentation, StandsOnNoNodeAtFirst) {
+TEST(Instrumentation, HasNoCurrentNodeAtFirst) {
     Instrumentation cursor;
     std::string value = "kept";
     EXPECT_FALSE(static_cast<bool>(cursor));
@@ -43,7 +43,7 @@ TEST(Instrumentation, SelectsAllNodesOfATypeInTreeOrder) {
     EXPECT_THAT(pathsOf(static_cast<NodeType>(78)), ElementsAre());
 }
 
-TEST(Instrumentation, StaysBeyondTheLastNode) {
+TEST(Instrumentation, StaysAfterTheLastNode) {
     Instrumentation cursor;
     cursor.selectNode(NT_SYSTEM);
     ASSERT_TRUE(static_cast<bool>(cursor));
@@ -67,7 +67,7 @@ TEST(Instrumentation, SelectsTheNodeAtAPath) {
     EXPECT_FALSE(static_cast<bool>(cursor));
 }
 
-TEST(Instrumentation, StartsAfreshWithEachSelection) {
+TEST(Instrumentation, RestartsWithEachSelection) {
     Instrumentation cursor;
     cursor.selectNode(NT_COMPUTER);
     ++cursor;
@@ -92,11 +92,11 @@ TEST(Instrumentation, ReadsPropertiesThatTheNodeHas) {
     EXPECT_EQ(value, "");
 }
 
-TEST(Instrumentation, KnowsThePathOfTheManagedComputer) {
+TEST(Instrumentation, ReturnsThePathOfTheManagedComputer) {
     EXPECT_EQ(Instrumentation().getPathToComputer(), "/system/computer");
 }
 
-TEST(Instrumentation, TurnsPathsIntoTextAndBack) {
+TEST(Instrumentation, ConvertsPathsToStringsAndBack) {
     Instrumentation cursor;
     for (cursor.selectNode(NT_COMPUTER); cursor; ++cursor) {
         const std::string path = cursor.getPathToNode();

@@ -7,7 +7,7 @@
 using RZLog::Channel;
 using RZLog::Levels;
 
-TEST(Levels, AdmitByDefaultWhatIsNotAboveTheErrorLevel) {
+TEST(Levels, AdmitErrorsByDefault) {
     const Levels levels;
     for (const Channel channel : {Channel::log, Channel::trace}) {
         EXPECT_TRUE(levels.admit(channel, "any", 3000));
@@ -15,14 +15,14 @@ TEST(Levels, AdmitByDefaultWhatIsNotAboveTheErrorLevel) {
     }
 }
 
-TEST(Levels, OfAChannelDoNotTouchTheOther) {
+TEST(Levels, AreSeparatePerChannel) {
     Levels levels;
     levels.setDefault({4000, 0});
     EXPECT_TRUE(levels.admit(Channel::log, "any", 4000));
     EXPECT_FALSE(levels.admit(Channel::trace, "any", 3000));
 }
 
-TEST(Levels, OfALoggerHoldForItsExactNameOnly) {
+TEST(Levels, OfALoggerApplyToItsExactName) {
     Levels levels;
     ASSERT_TRUE(levels.set("Ostrel.One", {6000, 100}));
     EXPECT_TRUE(levels.admit(Channel::log, "Ostrel.One", 6000));

@@ -101,7 +101,7 @@ TEST(Libraries, ExportTheirInterfaceAndNothingElse) {
     EXPECT_THAT(framework, Each(testing::Not(testing::HasSubstr("Implementation"))));
 }
 
-TEST(Libraries, DefineNoSymbolThatWouldKeepThemInTheProcess) {
+TEST(Libraries, DefineNoSymbolThatPreventsUnloading) {
     for (const std::string& library : libraries) {
         for (const Symbol& symbol : exportsOf(library)) {
             EXPECT_NE(symbol.binding, STB_GNU_UNIQUE) << symbol.name;
@@ -109,7 +109,7 @@ TEST(Libraries, DefineNoSymbolThatWouldKeepThemInTheProcess) {
     }
 }
 
-TEST(Libraries, MayBeLoadedUsedAndUnloadedAgainAndAgain) {
+TEST(Libraries, CanBeLoadedUsedAndUnloadedRepeatedly) {
     using DirectoryFunction = const char* (*)();
     for (int round = 0; round < 20; ++round) {
         void* library = ::dlopen(KOFRAMEWORK_LIBRARY, RTLD_NOW | RTLD_GLOBAL);

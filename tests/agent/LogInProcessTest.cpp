@@ -53,7 +53,7 @@ TEST_F(LogInProcess, WritesARecordToEachChannel) {
                             MatchesRegex(timeFields + "\ttrace\t3000\tOstrel.Test\t\t\t-1\tsome text")));
 }
 
-TEST_F(LogInProcess, LetsNoClientForgeARecord) {
+TEST_F(LogInProcess, PreventsForgedRecords) {
     run(toFile(), {"log", "3000", "Ostrel\tTest", "text\n2024-01-01T00:00:00.000000+00:00\tlog\t3000\\"});
     ASSERT_THAT(lines(), SizeIs(2));
     EXPECT_THAT(lines()[0], HasSubstr("\tOstrel\\tTest\t"));
@@ -80,7 +80,7 @@ TEST_F(LogInProcess, WritesNothingAnywhereByDefault) {
     EXPECT_EQ(unconfigured.exitCode, 0);
 }
 
-TEST_F(LogInProcess, SaysBeforeARecordIsMadeWhetherAChannelWouldTakeIt) {
+TEST_F(LogInProcess, ReportsWhetherALevelIsAdmitted) {
     const auto admits = [&](const std::string& settings, const std::string& level, const std::string& logger) {
         const std::string configuration = directory.write("agent.toml", "[log]\n" + settings);
         return runProbe(configuration, {"admits", level, logger}).output;
@@ -96,12 +96,12 @@ TEST_F(LogInProcess, SaysBeforeARecordIsMadeWhetherAChannelWouldTakeIt) {
     EXPECT_EQ(admits("log_level = 6000\n", "3000", "Ostrel.Test"), "no\nno\n") << "there is no destination";
 }
 
-TEST_F(LogInProcess, SwallowsRecordsForAFileThatCannotBeOpened) {
+TEST_F(LogInProcess, DropsRecordsForAFileThatCannotBeOpened) {
     run("destination = '" + directory.path() + "'\n", {"log", "3000", "Ostrel.Test", "to a directory"});
     run("destination = '/proc/no/such/file'\n", {"log", "3000", "Ostrel.Test", "to nowhere"});
 }
 
-TEST_F(LogInProcess, SwallowsRecordsThatCannotBeWritten) {
+TEST_F(LogInProcess, DropsRecordsThatCannotBeWritten) {
     run(toFile(), {"limited"});
     EXPECT_LE(directory.read("agent.log").size(), 20U);
 }
@@ -110,17 +110,17 @@ TEST_F(LogInProcess, WritesToNoDevice) {
     run("destination = '/dev/full'\n", {"log", "3000", "Ostrel.Test", "to a device"});
 }
 
-TEST_F(LogInProcess, DoesNotWaitForThePartnerOfAPipe) {
+TEST_F(LogInProcess, DoesNotWaitForTheOtherEndOfAPipe) {
     ASSERT_EQ(::mkfifo(directory.file("pipe").c_str(), 0600), 0);
     run("destination = '" + directory.file("pipe") + "'\n", {"log", "3000", "Ostrel.Test", "into a pipe"});
 }
 
-TEST_F(LogInProcess, ToTheSystemsLogsIsQuietWhereThereAreNone) {
+TEST_F(LogInProcess, IsSilentWithoutSystemLogs) {
     run("destination = 'syslog'\n", {"log", "3000", "Ostrel.Test", "some text"});
     run("destination = 'journal'\n", {"log", "3000", "Ostrel.Test", "some text"});
 }
 
-TEST_F(LogInProcess, AddsToTheFileAndKeepsItFromEverybody) {
+TEST_F(LogInProcess, AppendsToAFileThatOthersCannotRead) {
     run(toFile(), {"log", "3000", "Ostrel.Test", "one"});
     run(toFile(), {"log", "3000", "Ostrel.Test", "two"});
     EXPECT_THAT(lines(), SizeIs(4));
@@ -129,20 +129,20 @@ TEST_F(LogInProcess, AddsToTheFileAndKeepsItFromEverybody) {
     EXPECT_EQ(status.st_mode & 07137U, 0U);
 }
 
-TEST_F(LogInProcess, LosesNothingWhenTheProcessEndsAbruptly) {
+TEST_F(LogInProcess, LosesNoRecordInACrash) {
     run(toFile(), {"crash"});
     ASSERT_THAT(lines(), SizeIs(2));
     EXPECT_THAT(lines()[0], HasSubstr("the last words"));
 }
 
-/** It is unwound by an exception that nobody may keep: else the C library ends the process. */
-TEST_F(LogInProcess, LetsAThreadThatIsCancelledEndAfterItsRecord) {
+/** Cancellation unwinds the stack with an exception; the C library aborts the process if a catch swallows it. */
+TEST_F(LogInProcess, CompletesTheRecordOfACancelledThread) {
     run(toFile(), {"cancelled"});
     ASSERT_THAT(lines(), SizeIs(2));
     EXPECT_THAT(lines()[1], HasSubstr("\ttrace\t3000\tOstrel.Test\t"));
 }
 
-TEST_F(LogInProcess, TakesRecordsFromManyThreads) {
+TEST_F(LogInProcess, AcceptsRecordsFromManyThreads) {
     run(toFile(), {"many", "4", "200"});
     std::vector<std::string> all = lines();
     ASSERT_THAT(all, SizeIs(800));
@@ -168,7 +168,7 @@ TEST_F(LogInProcess, RotatesTheFile) {
     }
 }
 
-TEST_F(LogInProcess, ReportsWhatIsWrongWithItsSettings) {
+TEST_F(LogInProcess, ReportsProblemsOfItsSettings) {
     run(toFile() + "log_level = 'high'\ncolour = 'red'\ntrace_level = 0\n", {"log", "4000", "Ostrel.Test", "text"});
     ASSERT_THAT(lines(), SizeIs(2));
     EXPECT_THAT(lines()[0], HasSubstr("\tlog\t3000\tOstrel.Agent\t"));

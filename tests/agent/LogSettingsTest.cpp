@@ -34,7 +34,7 @@ TEST_F(LogSettingsTest, HaveDefaults) {
     EXPECT_THAT(problems, IsEmpty());
 }
 
-TEST_F(LogSettingsTest, HaveTheDefaultsThatTheInstalledFileShows) {
+TEST_F(LogSettingsTest, HaveTheDefaultsOfTheInstalledFile) {
     const LogSettings shown = read(shippedConfiguration().c_str());
     EXPECT_EQ(shown.destination, LogSettings::Destination::none);
     EXPECT_EQ(shown.rotationSize, 10485760U);
@@ -46,7 +46,7 @@ TEST_F(LogSettingsTest, HaveTheDefaultsThatTheInstalledFileShows) {
     EXPECT_THAT(problems, IsEmpty());
 }
 
-TEST_F(LogSettingsTest, TakeEveryDestination) {
+TEST_F(LogSettingsTest, AcceptEveryDestination) {
     EXPECT_EQ(read("[log]\ndestination = 'none'").destination, LogSettings::Destination::none);
     EXPECT_EQ(read("[log]\ndestination = 'syslog'").destination, LogSettings::Destination::syslog);
     EXPECT_EQ(read("[log]\ndestination = 'journal'").destination, LogSettings::Destination::journal);
@@ -56,7 +56,7 @@ TEST_F(LogSettingsTest, TakeEveryDestination) {
     EXPECT_THAT(problems, IsEmpty());
 }
 
-TEST_F(LogSettingsTest, RefuseADestinationThatIsNeitherPathNorWord) {
+TEST_F(LogSettingsTest, RejectUnknownDestinations) {
     for (const char* text : {"[log]\ndestination = 'agent.log'", "[log]\ndestination = \"/a\\u0000b\""}) {
         problems.clear();
         EXPECT_EQ(read(text).destination, LogSettings::Destination::none);
@@ -65,14 +65,14 @@ TEST_F(LogSettingsTest, RefuseADestinationThatIsNeitherPathNorWord) {
     }
 }
 
-TEST_F(LogSettingsTest, TakeRotation) {
+TEST_F(LogSettingsTest, ReadRotation) {
     const LogSettings settings = read("[log]\nrotation_size = 5000\nrotation_count = 2\n");
     EXPECT_EQ(settings.rotationSize, 5000U);
     EXPECT_EQ(settings.rotationCount, 2U);
     EXPECT_THAT(problems, IsEmpty());
 }
 
-TEST_F(LogSettingsTest, GiveALoggerTheGeneralLevelsThatItHasNotItself) {
+TEST_F(LogSettingsTest, UseTheGeneralLevelsForLevelsThatALoggerLacks) {
     const LogSettings settings =
         read("[log]\nlog_level = 4000\ntrace_level = 100\n[[log.logger]]\nname = 'one'\ntrace_level = 6000\n");
     EXPECT_TRUE(settings.levels.admit(Channel::log, "one", 4000));
@@ -82,7 +82,7 @@ TEST_F(LogSettingsTest, GiveALoggerTheGeneralLevelsThatItHasNotItself) {
     EXPECT_THAT(problems, IsEmpty());
 }
 
-TEST_F(LogSettingsTest, NoteWhatIsWrong) {
+TEST_F(LogSettingsTest, ReportProblems) {
     read("[log]\ncolour = 'red'\nlog_level = 'high'\nrotation_size = 1\n[[log.logger]]\nlevel = 1\n");
     EXPECT_THAT(problems,
                 ElementsAre("configuration key log.rotation_size must be an integer from 4096 to 2147483647; "

@@ -12,7 +12,7 @@ using RZLog::RZMessageBuffer;
 
 namespace {
 
-/** What a fresh buffer makes of some values. */
+/** The string that a new buffer makes of some values. */
 std::string sampleOfFreshBuffer() {
     RZMessageBuffer buffer;
     static_cast<std::ostream&>(buffer) << 1234567 << ' ' << 0.5 << ' ' << true << ' ' << std::setw(4) << 7;
@@ -28,13 +28,13 @@ struct Grouping : std::numpunct<char> {
 
 }  // namespace
 
-TEST(MessageBuffer, PutsTextsAndValuesTogether) {
+TEST(MessageBuffer, ConcatenatesStringsAndValues) {
     RZMessageBuffer buffer;
     buffer << " key_value=" << std::string("a b") << ' ' << 42;
     EXPECT_EQ(buffer.str(buffer), " key_value=a b 42");
 }
 
-TEST(MessageBuffer, GivesItsTextForTheStreamToo) {
+TEST(MessageBuffer, ReturnsItsStringForTheStreamToo) {
     RZMessageBuffer buffer;
     EXPECT_EQ(buffer.str(buffer << "text"), "text");
     EXPECT_EQ(buffer.str(buffer << "more" << 1), "more1");
@@ -49,7 +49,7 @@ TEST(MessageBuffer, IsEmptyAfterTaking) {
     EXPECT_EQ(buffer.str(buffer), "second");
 }
 
-TEST(MessageBuffer, TakesANullTextForNoText) {
+TEST(MessageBuffer, TreatsNullAsAnEmptyString) {
     RZMessageBuffer buffer;
     buffer << "a";
     buffer << nullptr;
@@ -57,7 +57,7 @@ TEST(MessageBuffer, TakesANullTextForNoText) {
     EXPECT_EQ(buffer.str(buffer), "ab");
 }
 
-TEST(MessageBuffer, KeepsNulCharactersAndLongTexts) {
+TEST(MessageBuffer, KeepsNulCharactersAndLongStrings) {
     RZMessageBuffer buffer;
     const std::string text = std::string(200000, 'x') + '\0' + "end";
     static_cast<std::ostream&>(buffer) << text << '\0';
@@ -65,7 +65,7 @@ TEST(MessageBuffer, KeepsNulCharactersAndLongTexts) {
     EXPECT_EQ(sampleOfFreshBuffer(), sample);
 }
 
-TEST(MessageBuffer, IsLikeNewWhateverWasDoneToTheOneBefore) {
+TEST(MessageBuffer, InheritsNoStateFromThePreviousBuffer) {
     for (int round = 0; round < 3; ++round) {
         RZMessageBuffer buffer;
         std::ostream& stream = buffer;
@@ -84,7 +84,7 @@ TEST(MessageBuffer, IsLikeNewWhateverWasDoneToTheOneBefore) {
     EXPECT_EQ(sampleOfFreshBuffer(), sample);
 }
 
-TEST(MessageBuffer, StartsEachMessageLikeNew) {
+TEST(MessageBuffer, ResetsItsStateAfterEachMessage) {
     RZMessageBuffer buffer;
     std::ostream& stream = buffer;
     stream << std::hex << 255;
@@ -114,7 +114,7 @@ TEST(MessageBuffer, SharesNothingWithTheOthers) {
     EXPECT_EQ(other.str(other), "other");
 }
 
-TEST(MessageBuffer, MayBeMadeByManyThreadsAtATime) {
+TEST(MessageBuffer, CanBeCreatedConcurrently) {
     std::vector<std::thread> threads;
     std::vector<int> failures(4);
     for (std::size_t number = 0; number < failures.size(); ++number) {

@@ -24,7 +24,7 @@ TEST(Moniker, IsEmptyWithNothingSelectedAtFirst) {
     EXPECT_EQ(text, "kept");
 }
 
-TEST(Moniker, GivesNameAndValueOfTheSelectedKey) {
+TEST(Moniker, ReturnsNameAndValueOfTheSelectedKey) {
     Moniker moniker;
     moniker.addKey("Name", "host1");
     moniker.addKey("Name", "");
@@ -38,7 +38,7 @@ TEST(Moniker, GivesNameAndValueOfTheSelectedKey) {
     EXPECT_EQ(value, "");
 }
 
-TEST(Moniker, KeepsItsSelectionWhenAnotherCannotBeMade) {
+TEST(Moniker, KeepsItsSelectionIfAnotherIsInvalid) {
     Moniker moniker;
     moniker.addKey("a", "1");
     moniker.selectKey(0);

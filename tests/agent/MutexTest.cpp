@@ -13,7 +13,7 @@ namespace {
 
 constexpr unsigned long withoutLimit = 0xFFFFFFFF;
 
-/** Whether another thread can have the mutex at once. */
+/** Whether another thread can lock the mutex without waiting. */
 bool isFree(Mutex& mutex) {
     bool taken = false;
     std::thread([&mutex, &taken] {
@@ -29,7 +29,7 @@ bool isFree(Mutex& mutex) {
 
 }  // namespace
 
-TEST(Mutex, KeepsOtherThreadsOutUntilItIsUnlocked) {
+TEST(Mutex, ExcludesOtherThreadsUntilItIsUnlocked) {
     Mutex mutex;
     EXPECT_TRUE(isFree(mutex));
     mutex.lock(withoutLimit);
@@ -38,7 +38,7 @@ TEST(Mutex, KeepsOtherThreadsOutUntilItIsUnlocked) {
     EXPECT_TRUE(isFree(mutex));
 }
 
-TEST(Mutex, MayBeTakenWithATimeLimit) {
+TEST(Mutex, CanBeLockedWithATimeout) {
     Mutex mutex;
     mutex.lock(60000);
     EXPECT_FALSE(isFree(mutex));
@@ -46,7 +46,7 @@ TEST(Mutex, MayBeTakenWithATimeLimit) {
     EXPECT_TRUE(isFree(mutex));
 }
 
-TEST(Mutex, SaysThatTheTimeIsOver) {
+TEST(Mutex, ReportsATimeout) {
     Mutex mutex;
     mutex.lock(withoutLimit);
     std::string message;
@@ -61,7 +61,7 @@ TEST(Mutex, SaysThatTheTimeIsOver) {
     mutex.unlock();
 }
 
-TEST(Mutex, RefusesASecondLockOfOneThreadInsteadOfWaitingForever) {
+TEST(Mutex, RejectsASecondLockByTheSameThread) {
     Mutex mutex;
     mutex.lock(withoutLimit);
     EXPECT_THROW(mutex.lock(withoutLimit), FrameworkException);
@@ -70,7 +70,7 @@ TEST(Mutex, RefusesASecondLockOfOneThreadInsteadOfWaitingForever) {
     EXPECT_TRUE(isFree(mutex));
 }
 
-TEST(Mutex, IgnoresAnUnlockByAThreadThatHasItNot) {
+TEST(Mutex, IgnoresAnUnlockByAnotherThread) {
     Mutex mutex;
     mutex.lock(withoutLimit);
     std::thread([&mutex] { mutex.unlock(); }).join();
@@ -80,7 +80,7 @@ TEST(Mutex, IgnoresAnUnlockByAThreadThatHasItNot) {
     EXPECT_TRUE(isFree(mutex));
 }
 
-TEST(Mutex, LetsOneThreadIntoTheSectionAtATime) {
+TEST(Mutex, AdmitsOneThreadIntoACriticalSection) {
     Mutex mutex;
     int count = 0;
     const auto work = [&mutex, &count] {

@@ -5,18 +5,18 @@
 using KO::pathToText;
 using KO::textToPath;
 
-TEST(NodePath, IsItsOwnTextWhenItIsPlain) {
+TEST(NodePath, IsUnchangedIfItIsPlain) {
     EXPECT_EQ(pathToText("/system/computer"), "/system/computer");
     EXPECT_EQ(pathToText("Az09./:-"), "Az09./:-");
     EXPECT_EQ(pathToText(""), "");
 }
 
-TEST(NodePath, HasNeitherBlankNorUnderscoreInItsText) {
+TEST(NodePath, EncodesBlanksAndUnderscores) {
     EXPECT_EQ(pathToText("/rack 1/host_2\t\n%"), "/rack%201/host%5F2%09%0A%25");
     EXPECT_EQ(pathToText("\xC3\xA9"), "%C3%A9");
 }
 
-TEST(NodePath, ComesBackFromItsText) {
+TEST(NodePath, IsDecodedFromItsString) {
     std::string everyByte;
     for (int byte = 0; byte < 256; ++byte) {
         everyByte += static_cast<char>(byte);
@@ -26,7 +26,7 @@ TEST(NodePath, ComesBackFromItsText) {
     EXPECT_EQ(text.find_first_of(" \t\r\n\v\f_"), std::string::npos);
 }
 
-TEST(NodePath, GivesBackATextThatIsNoTextOfAPath) {
+TEST(NodePath, ReturnsInvalidEncodingsUnchanged) {
     for (const char* text :
          {"L 1", "under_score", "%2f", "%2F", "%41", "%", "%2", "%4", "50%", "%G0", "%0g", "a%20b c"}) {
         EXPECT_EQ(textToPath(text), text);

@@ -14,7 +14,7 @@ TEST(NodeTree, KeepsTheOrderInWhichNodesWerePut) {
     EXPECT_THAT(tree.nodes(), ElementsAre(Field(&Node::path, "/b"), Field(&Node::path, "/a")));
 }
 
-TEST(NodeTree, ReplacesTheNodeAtAPathAsAWhole) {
+TEST(NodeTree, ReplacesTheCompleteNodeAtAPath) {
     NodeTree tree;
     tree.put({1, "/a", {{108, "old"}, {36, "vendor"}}});
     tree.put({1, "/b", {}});

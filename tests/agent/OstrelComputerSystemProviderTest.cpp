@@ -69,7 +69,7 @@ protected:
 
 }  // namespace
 
-TEST_F(OstrelComputerSystemProviderTest, HandsOutItsInterface) {
+TEST_F(OstrelComputerSystemProviderTest, ReturnsItsInterface) {
     CMPIStatus status{CMPI_RC_ERR_FAILED, nullptr};
     const CMPIInstanceMI* interface = OstrelComputerSystemProvider_Create_InstanceMI(host.handle(), context, &status);
     ASSERT_NE(interface, nullptr);
@@ -88,7 +88,7 @@ TEST_F(OstrelComputerSystemProviderTest, NamesEveryComputerThatHasAName) {
     EXPECT_EQ(cimhost::doneCount(events), 1);
 }
 
-TEST_F(OstrelComputerSystemProviderTest, GivesEveryPropertyThatTheComputerHas) {
+TEST_F(OstrelComputerSystemProviderTest, ReturnsEveryPropertyOfTheComputer) {
     EXPECT_TRUE(enumerate().ok());
     ASSERT_EQ(instances().size(), 2U);
     EXPECT_EQ(nameIn(instances()[0].path), "host1");
@@ -118,14 +118,14 @@ TEST_F(OstrelComputerSystemProviderTest, FindsNoComputerOfAnotherName) {
     EXPECT_THAT(events, IsEmpty());
 }
 
-TEST_F(OstrelComputerSystemProviderTest, WantsTheKeyToGetAComputer) {
+TEST_F(OstrelComputerSystemProviderTest, RequiresTheKeyToGetAComputer) {
     const cimhost::Status status = get(path({{"InstanceID", text("host1")}}));
     EXPECT_EQ(status.rc, CMPI_RC_ERR_INVALID_PARAMETER);
     EXPECT_EQ(status.message, "The key Name is missing or is not a string");
     EXPECT_EQ(get(path({{"Name", agent_test::nullOf(CMPI_string)}})).rc, CMPI_RC_ERR_INVALID_PARAMETER);
 }
 
-TEST_F(OstrelComputerSystemProviderTest, GivesThePropertiesOfTheListAndTheKey) {
+TEST_F(OstrelComputerSystemProviderTest, ReturnsThePropertiesOfTheListAndTheKey) {
     const char* list[] = {"vendor", "NoSuchProperty", "MODEL", nullptr};
     EXPECT_TRUE(get(path({{"Name", text("host1")}}), list).ok());
     EXPECT_TRUE(enumerate(list).ok());
@@ -139,7 +139,7 @@ TEST_F(OstrelComputerSystemProviderTest, GivesThePropertiesOfTheListAndTheKey) {
     EXPECT_THAT(propertiesOf(instances().back()), ElementsAre(Pair("Name", "host1")));
 }
 
-TEST_F(OstrelComputerSystemProviderTest, ServesNoOtherClass) {
+TEST_F(OstrelComputerSystemProviderTest, RejectsOtherClasses) {
     const cimhost::Status status = enumerateNames(path({}, "VELKO_Lease"));
     EXPECT_EQ(status.rc, CMPI_RC_ERR_INVALID_CLASS);
     EXPECT_EQ(status.message, "This provider serves VELKO_ComputerSystem only");
@@ -159,14 +159,14 @@ TEST_F(OstrelComputerSystemProviderTest, IsReadOnlyAndAnswersNoQueries) {
     EXPECT_THAT(events, IsEmpty());
 }
 
-TEST_F(OstrelComputerSystemProviderTest, GoesOnAfterCleanup) {
+TEST_F(OstrelComputerSystemProviderTest, WorksAfterCleanup) {
     EXPECT_EQ(mi->ft->cleanup(mi, context, 1).rc, CMPI_RC_OK);
     EXPECT_EQ(mi->ft->cleanup(mi, context, 0).rc, CMPI_RC_OK);
     EXPECT_TRUE(enumerate().ok());
     EXPECT_EQ(instances().size(), 2U);
 }
 
-TEST_F(OstrelComputerSystemProviderTest, SaysThatTheBrokerCouldNotMakeAnObject) {
+TEST_F(OstrelComputerSystemProviderTest, ReportsThatTheBrokerCannotCreateAnObject) {
     cimhost::FunctionTables tables = cimhost::standardTables();
     tables.encapsulation.newInstance = [](const CMPIBroker*, const CMPIObjectPath*,
                                           CMPIStatus* status) -> CMPIInstance* {
@@ -182,7 +182,7 @@ TEST_F(OstrelComputerSystemProviderTest, SaysThatTheBrokerCouldNotMakeAnObject) 
     EXPECT_THAT(events, IsEmpty());
 }
 
-TEST_F(OstrelComputerSystemProviderTest, AnswersOnManyThreadsAtATime) {
+TEST_F(OstrelComputerSystemProviderTest, AnswersConcurrentRequests) {
     std::vector<std::thread> threads;
     std::vector<std::size_t> counts(4);
     for (std::size_t& count : counts) {

@@ -25,7 +25,7 @@ inline cimhost::Value nullOf(CMPIType type) {
     return {type, false, true, {}};
 }
 
-/** The text of a value that is one; otherwise a text that no test expects. */
+/** The string of a string value; otherwise a string that no test expects. */
 inline std::string textIn(const cimhost::Value& value) {
     const std::string* found = value.elements.empty() ? nullptr : std::get_if<std::string>(&value.elements.front());
     return found != nullptr ? *found : "(no text)";

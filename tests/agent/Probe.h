@@ -5,7 +5,7 @@
 
 namespace agent_test {
 
-/** How a probe process ended and what it said on its standard streams. */
+/** Exit code and output of a probe process. */
 struct ProbeResult {
     int exitCode;  ///< -1 when it did not end by itself
     std::string output;
@@ -15,7 +15,7 @@ struct ProbeResult {
 /** Runs the probe under a configuration file; an empty path leaves the variable unset. */
 ProbeResult runProbe(const std::string& configuration, std::vector<std::string> arguments);
 
-/** The same with another program in the probe's place. */
+/** Runs another program instead of the probe. */
 ProbeResult runProgram(const std::string& program, const std::string& configuration,
                        std::vector<std::string> arguments);
 

@@ -16,11 +16,11 @@ TEST(Product, IsAsConfigured) {
     EXPECT_EQ(Product::getVendor(), L"Gr\u00fcn");
 }
 
-TEST(PlatformUtilities, GiveDirectoriesThatEndWithASeparator) {
+TEST(PlatformUtilities, ReturnDirectoriesThatEndWithASeparator) {
     EXPECT_EQ(PlatformUtilities::getKelsaDirectory(), agent_test::configuredDirectory() + "install/");
     EXPECT_EQ(PlatformUtilities::getKelsaDataDir(), agent_test::configuredDirectory() + "data/");
 }
 
-TEST(PlatformUtilities, GiveTheSameTextEachTime) {
+TEST(PlatformUtilities, ReturnTheSameStringEachTime) {
     EXPECT_EQ(static_cast<const void*>(PlatformUtilities::getKelsaDataDir()), PlatformUtilities::getKelsaDataDir());
 }

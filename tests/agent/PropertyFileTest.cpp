@@ -32,7 +32,7 @@ protected:
 
 }  // namespace
 
-TEST_F(PropertyFileTest, KeepsTextsAndDates) {
+TEST_F(PropertyFileTest, KeepsStringsAndDates) {
     const DateTime date = Utils::convertStringToDateTime("20240229123456.000789-330");
     file.open(3);
     Utils::WriteStringToFile(file, "USER.Name", "Ann\nBea = 1");
@@ -48,7 +48,7 @@ TEST_F(PropertyFileTest, KeepsTextsAndDates) {
     EXPECT_EQ(directory.read("asset.dat"), "USER.Name=Ann\\nBea = 1\nUSER.PurchaseDate=20240229123456.000789-330\n");
 }
 
-TEST_F(PropertyFileTest, ReadsAbsentKeysAsEmptyTextAndNoDate) {
+TEST_F(PropertyFileTest, ReadsAbsentKeysAsEmptyStringsAndNoDate) {
     directory.write("asset.dat", "USER.PurchaseDate=yesterday\n");
     file.open(1);
     EXPECT_EQ(Utils::ReadStringFromFile(file, "USER.Name"), "");
@@ -57,14 +57,14 @@ TEST_F(PropertyFileTest, ReadsAbsentKeysAsEmptyTextAndNoDate) {
               "00000000000000.000000-000");
 }
 
-TEST_F(PropertyFileTest, WritesNoDateAsEmptyText) {
+TEST_F(PropertyFileTest, WritesNoDateAsAnEmptyString) {
     file.open(3);
     Utils::WriteDateToFile(file, "key", DateTime());
     file.close();
     EXPECT_EQ(directory.read("asset.dat"), "key=\n");
 }
 
-TEST_F(PropertyFileTest, KeepsWhatNobodyWrites) {
+TEST_F(PropertyFileTest, KeepsEntriesThatAreNotWritten) {
     directory.write("asset.dat", "# by hand\nOTHER.Key = 1\nUSER.Name=old\n");
     file.open(3);
     Utils::WriteStringToFile(file, "USER.Name", "new");
@@ -81,7 +81,7 @@ TEST_F(PropertyFileTest, IsCreatedEmptyWhenOpenedForWriting) {
     file.close();
 }
 
-TEST_F(PropertyFileTest, IsNotTouchedWhenNothingWasWritten) {
+TEST_F(PropertyFileTest, IsNotReplacedIfNothingWasWritten) {
     directory.write("asset.dat", "a=1\nno line end");
     const ino_t before = identity();
     file.open(3);
@@ -90,7 +90,7 @@ TEST_F(PropertyFileTest, IsNotTouchedWhenNothingWasWritten) {
     EXPECT_EQ(directory.read("asset.dat"), "a=1\nno line end");
 }
 
-TEST_F(PropertyFileTest, ShowsNothingOfTheNewContentBeforeItIsClosed) {
+TEST_F(PropertyFileTest, IsReplacedWhenItIsClosed) {
     directory.write("asset.dat", "a=1\n");
     file.open(3);
     Utils::WriteStringToFile(file, "a", "2");
@@ -99,7 +99,7 @@ TEST_F(PropertyFileTest, ShowsNothingOfTheNewContentBeforeItIsClosed) {
     EXPECT_EQ(directory.read("asset.dat"), "a=2\n");
 }
 
-TEST_F(PropertyFileTest, DropsWhatWasWrittenUnlessItIsClosed) {
+TEST_F(PropertyFileTest, DiscardsChangesUnlessItIsClosed) {
     directory.write("asset.dat", "a=1\n");
     {
         PropertyFile abandoned(path(directory.file("asset.dat")));
@@ -146,7 +146,7 @@ TEST_F(PropertyFileTest, CannotBeWrittenWhenOpenedForReading) {
     EXPECT_EQ(directory.read("asset.dat"), "a=1\n");
 }
 
-TEST_F(PropertyFileTest, SaysWhyItCannotBeOpened) {
+TEST_F(PropertyFileTest, ReportsWhyItCannotBeOpened) {
     PropertyFile ofDirectory(path(directory.path()));
     for (const unsigned long mode : {1UL, 3UL}) {
         try {

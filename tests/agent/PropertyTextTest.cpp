@@ -6,7 +6,7 @@ using KO::PropertyText;
 
 namespace {
 
-/** What is read under a key after a text with one setting has been written and read. */
+/** The value of a key after a property file with one entry has been written and read. */
 std::string roundTrip(const std::string& key, const std::string& value) {
     PropertyText written;
     written.set("before", "1");
@@ -44,7 +44,7 @@ TEST(PropertyText, ReadsTheFirstOfTwoEntriesOfAKey) {
     EXPECT_EQ(text.text(), "a=3\na=2\n");
 }
 
-TEST(PropertyText, KeepsOrderCommentsAndWhatIsNotSet) {
+TEST(PropertyText, KeepsOrderCommentsAndOtherEntries) {
     PropertyText text("# head\n\nb = 1 \r\nstray\na=\\q\n");
     text.set("c", "3");
     text.set("a", "2");
@@ -74,13 +74,13 @@ TEST(PropertyText, KeepsEveryByteOfAKey) {
     }
 }
 
-TEST(PropertyText, WritesEscapesThatPeopleCanRead) {
+TEST(PropertyText, WritesReadableEscapes) {
     PropertyText text;
     text.set("a=b #1", " line 1\nline\t2\\ ");
     EXPECT_EQ(text.text(), "a\\x3Db \\x231=\\x20line 1\\nline\\x092\\\\\\x20\n");
 }
 
-TEST(PropertyText, TakesABackslashBeforeAnythingElseForItself) {
+TEST(PropertyText, KeepsABackslashBeforeOtherCharacters) {
     const PropertyText text("a=\\q\nb=\\x4\nc=\\x4g\nd=C:\\dir\\\n");
     EXPECT_EQ(text.get("a"), "\\q");
     EXPECT_EQ(text.get("b"), "\\x4");

@@ -9,8 +9,8 @@
 using KO::Moniker;
 using KO::ProviderUtilities;
 
-// Object managers give providers odd values. These tests make them by hand: a table holds just the
-// functions that a test needs, and the answers of a path or instance are in its handle.
+// Object managers pass odd values to providers. These tests construct them: a function table has only the functions
+// that a test needs, and the handle of a path or instance has the values that it returns.
 
 namespace {
 
@@ -30,7 +30,7 @@ struct FakeString {
     CMPIString object{};
 };
 
-/** What a path or instance answers, whatever key or property it is asked for. */
+/** The value that a path or instance returns for every key or property. */
 struct Answers {
     CMPIData data{};
     CMPIrc rc = CMPI_RC_OK;
@@ -105,7 +105,7 @@ CMPIData charsData(const char* characters) {
 
 class Quirks : public testing::Test {
 protected:
-    /** Whether text is read, as a key and as a property; both must agree. */
+    /** Whether a string is read, as a key and as a property; both must agree. */
     bool readsText(const CMPIData& data, CMPIrc rc = CMPI_RC_OK) {
         path.answers.data = data;
         path.answers.rc = rc;
@@ -128,7 +128,7 @@ protected:
 
 }  // namespace
 
-TEST_F(Quirks, AStateOfNullCountsWhateverTheValueIs) {
+TEST_F(Quirks, ANullStateOverridesTheValue) {
     EXPECT_FALSE(readsText(stringData(&withoutCharacters.object, CMPI_nullValue)));
     EXPECT_FALSE(readsText(stringData(&good.object, CMPI_nullValue)));
     EXPECT_FALSE(readsText(stringData(&good.object, CMPI_notFound)));
@@ -154,17 +154,17 @@ TEST_F(Quirks, AKeyValueIsAValue) {
     EXPECT_FALSE(readsText(stringData(&good.object, CMPI_keyValue | CMPI_nullValue)));
 }
 
-TEST_F(Quirks, CharactersAreTextLikeStrings) {
+TEST_F(Quirks, CharactersAreReadAsStrings) {
     EXPECT_TRUE(readsText(charsData("plain")));
     EXPECT_EQ(text, "plain");
 }
 
-TEST_F(Quirks, AFailingStatusCountsWhateverTheValueIs) {
+TEST_F(Quirks, AFailedStatusOverridesTheValue) {
     EXPECT_FALSE(readsText(stringData(&good.object, CMPI_goodValue), CMPI_RC_ERR_NOT_FOUND));
     EXPECT_FALSE(readsText(charsData("plain"), CMPI_RC_ERR_NO_SUCH_PROPERTY));
 }
 
-TEST_F(Quirks, AnotherTypeIsNotTakenForText) {
+TEST_F(Quirks, AnotherTypeIsNotReadAsAString) {
     CMPIData data = stringData(&good.object, CMPI_goodValue);
     for (const int type :
          {CMPI_null, CMPI_ref, CMPI_uint32, CMPI_boolean, CMPI_dateTimeA, CMPI_stringA, CMPI_instance}) {
@@ -178,7 +178,7 @@ TEST_F(Quirks, AnotherTypeIsNotTakenForText) {
     }
 }
 
-TEST_F(Quirks, ADateTimeWithoutTextIsAbsent) {
+TEST_F(Quirks, ADateTimeWithoutAStringIsAbsent) {
     CMPIData data{};
     data.type = CMPI_dateTime;
     EXPECT_FALSE(readsText(data)) << "null object";
@@ -199,7 +199,7 @@ TEST_F(Quirks, ANullReferenceIsAbsent) {
     EXPECT_FALSE(ProviderUtilities::getKeyProperty(&path.object, "Dependent", static_cast<CMPIObjectPath**>(nullptr)));
 }
 
-TEST_F(Quirks, KeysWithoutNameAreLeftOutOfAMoniker) {
+TEST_F(Quirks, KeysWithoutNameAreSkippedInAMoniker) {
     path.answers.data = charsData("value");
     path.answers.keyCount = 2;
     Moniker moniker;
@@ -212,7 +212,7 @@ TEST_F(Quirks, KeysWithoutNameAreLeftOutOfAMoniker) {
     EXPECT_EQ(moniker.getKeyCount(), 2U);
 }
 
-TEST_F(Quirks, MoreKeysThanCanBeCountedAreTheMost) {
+TEST_F(Quirks, TheKeyCountIsLimitedByItsType) {
     path.answers.keyCount = 0x10001;
     EXPECT_EQ(ProviderUtilities::getKeyCount(&path.object), 0xFFFF);
 }
@@ -313,7 +313,7 @@ CMPIDateTime* makeDateTimeButFail(const CMPIBroker*, const char*, CMPIStatus* st
 
 }  // namespace
 
-TEST(MissingParts, AnObjectMadeWithAFailingStatusIsNone) {
+TEST(MissingParts, AnObjectCreatedWithAFailedStatusIsNull) {
     CMPIBrokerEncFT table{};
     table.newInstance = makeInstanceButFail;
     CMPIBroker broker{};
@@ -322,7 +322,7 @@ TEST(MissingParts, AnObjectMadeWithAFailingStatusIsNone) {
     EXPECT_EQ(ProviderUtilities::createInstance(&broker, &path), nullptr);
 }
 
-TEST(MissingParts, ADateTimeThatTheBrokerRefusesIsSetToNull) {
+TEST(MissingParts, ADateTimeThatTheBrokerRejectsIsSetToNull) {
     CMPIBrokerEncFT brokerTable{};
     brokerTable.newDateTimeFromChars = makeDateTimeButFail;
     CMPIBroker broker{};

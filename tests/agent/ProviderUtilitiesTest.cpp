@@ -113,7 +113,7 @@ TEST_F(ProviderUtilitiesTest, ReadNamespaceAndKeysOfAPath) {
     EXPECT_EQ(found, kept);
 }
 
-TEST_F(ProviderUtilitiesTest, ReadAKeyThatIsNoTextAsNoText) {
+TEST_F(ProviderUtilitiesTest, ReadOnlyStringsAsStringKeys) {
     const CMPIObjectPath* object =
         path("VELKO_Lease", {{"Number", plain(CMPI_uint32, std::uint32_t{7})}, {"Nothing", nullOf(CMPI_string)}});
     std::string value = "kept";
@@ -122,7 +122,7 @@ TEST_F(ProviderUtilitiesTest, ReadAKeyThatIsNoTextAsNoText) {
     EXPECT_EQ(value, "kept");
 }
 
-TEST_F(ProviderUtilitiesTest, MakePathsWithKeys) {
+TEST_F(ProviderUtilitiesTest, CreatePathsWithKeys) {
     CMPIObjectPath* object = ProviderUtilities::createObjectPath(broker, "VELKO_Lease", "root/other");
     ASSERT_NE(object, nullptr);
     ProviderUtilities::setKeyProperty(object, "InstanceID", std::string("first"));
@@ -159,7 +159,7 @@ TEST_F(ProviderUtilitiesTest, SetPropertiesOfEveryType) {
     EXPECT_EQ(textIn(properties[5].value), "Example");
 }
 
-TEST_F(ProviderUtilitiesTest, SetDateTimesFromTheirText) {
+TEST_F(ProviderUtilitiesTest, SetDateTimesFromStrings) {
     for (std::string date : {"20240229123456.000789-330", "00000010120000.000000:000"}) {
         CMPIInstance* object = instance();
         ProviderUtilities::setProperty(broker, object, "Date", date, true);
@@ -170,7 +170,7 @@ TEST_F(ProviderUtilitiesTest, SetDateTimesFromTheirText) {
     }
 }
 
-TEST_F(ProviderUtilitiesTest, SetADateTimeThatIsNoneToNull) {
+TEST_F(ProviderUtilitiesTest, SetAnInvalidDateTimeToNull) {
     for (std::string date : {"", "00000000000000.000000-000", "20230229000000.000000+000", "20241301000000.000000+000",
                              "tomorrow", "2024"}) {
         CMPIInstance* object = instance();
@@ -181,7 +181,7 @@ TEST_F(ProviderUtilitiesTest, SetADateTimeThatIsNoneToNull) {
     }
 }
 
-TEST_F(ProviderUtilitiesTest, ReadTextsAndDateTimesWhicheverFlagIsPassed) {
+TEST_F(ProviderUtilitiesTest, ReadStringsAndDateTimesWithEitherFlag) {
     const CMPIInstance* object =
         instance({{"Lessor", text("Example")},
                   {"Date", plain(CMPI_dateTime, cimhost::DateTime{"20240229123456.000789-330"})},
@@ -223,7 +223,7 @@ TEST_F(ProviderUtilitiesTest, ReadEveryIntegerThatFitsAnUnsignedOne) {
     }
 }
 
-TEST_F(ProviderUtilitiesTest, ReadNoIntegerThatDoesNotFitOrIsNone) {
+TEST_F(ProviderUtilitiesTest, RejectIntegersThatDoNotFit) {
     const CMPIInstance* object = instance({
         {"large", plain(CMPI_uint64, std::uint64_t{4294967296U})},
         {"larger", plain(CMPI_sint64, std::int64_t{4294967296})},
@@ -257,7 +257,7 @@ TEST_F(ProviderUtilitiesTest, ReadBooleans) {
     EXPECT_FALSE(value);
 }
 
-TEST_F(ProviderUtilitiesTest, TurnAPathIntoAMoniker) {
+TEST_F(ProviderUtilitiesTest, ConvertAPathToAMoniker) {
     Moniker moniker;
     moniker.addKey("Before", "0");
     ProviderUtilities::transformObjectPathToMoniker(
@@ -273,7 +273,7 @@ TEST_F(ProviderUtilitiesTest, TurnAPathIntoAMoniker) {
                             Pair("Count", "18446744073709551615"), Pair("Flag", "true"), Pair("InstanceID", "")));
 }
 
-TEST_F(ProviderUtilitiesTest, TurnAMonikerIntoKeysOfAPath) {
+TEST_F(ProviderUtilitiesTest, ConvertAMonikerToKeysOfAPath) {
     Moniker moniker;
     moniker.addKey("InstanceID", "/system/computer");
     moniker.addKey("Name", "host1");

@@ -46,7 +46,7 @@ TEST(LogRecord, IsALineOfTabSeparatedFields) {
               "2023-11-14T22:13:20.000012+00:00\ttrace\t4000\tOstrel.Test\tgetLessor\tLease.cpp\t42\tENTERING: x");
 }
 
-TEST(LogRecord, CarriesLocalTimeWithItsOffset) {
+TEST(LogRecord, HasLocalTimeWithItsOffset) {
     {
         const TimeZone zone("EAST-05:45");
         EXPECT_EQ(RZLog::fileLine(sample, moment(1700000000, 0)).substr(0, 32), "2023-11-15T03:58:20.000000+05:45");
@@ -55,7 +55,7 @@ TEST(LogRecord, CarriesLocalTimeWithItsOffset) {
     EXPECT_EQ(RZLog::fileLine(sample, moment(1700000000, 999999)).substr(0, 32), "2023-11-14T18:43:20.999999-03:30");
 }
 
-TEST(LogRecord, EscapesEveryTextField) {
+TEST(LogRecord, EscapesEveryStringField) {
     const Record forged{Channel::log, 3000, "a\tb", "c\nd", "e\rf", 1, "g\nh"};
     EXPECT_THAT(RZLog::fileLine(forged, moment(0, 0)),
                 MatchesRegex(R"([^	]+	log	3000	a\\tb	c\\nd	e\\rf	1	g\\nh)"));
@@ -66,7 +66,7 @@ TEST(LogRecord, ForASystemLogIsOneLineWithoutTime) {
     EXPECT_EQ(RZLog::systemLogLine(forged), "log 3000 Ostrel.Test load() in Lease.cpp:42: bad\\nline");
 }
 
-TEST(LogEscaping, LeavesPrintableTextAsItIs) {
+TEST(LogEscaping, KeepsPrintableCharacters) {
     EXPECT_EQ(escaped("Any text ~ \"quoted\""), "Any text ~ \"quoted\"");
     EXPECT_EQ(escaped("Gr\xC3\xBC\xC3\x9F"
                       "e \xE2\x82\xAC \xF0\x9F\x98\x80"),

@@ -35,7 +35,7 @@ std::size_t entriesOf(const TemporaryDirectory& directory) {
 
 }  // namespace
 
-TEST(ReplacementFile, TakesThePlaceOfTheOldOneWithItsMode) {
+TEST(ReplacementFile, ReplacesTheOldFileAndKeepsItsMode) {
     const TemporaryDirectory directory;
     const std::string path = directory.write("file", "old");
     ASSERT_EQ(::chmod(path.c_str(), 0604), 0);
@@ -61,7 +61,7 @@ TEST(ReplacementFile, KeepsTheOwner) {
     EXPECT_EQ(modeOf(path), 0660U);
 }
 
-/** What the file is after somebody without rights, who may write to its directory, has replaced it. */
+/** Attributes of the file after an unprivileged user with write access to its directory has replaced it. */
 struct stat statusAfterReplacement(const TemporaryDirectory& directory, const std::vector<gid_t>& groupsOfReplacer) {
     constexpr uid_t somebody = 65534;
     EXPECT_EQ(::chown(directory.path().c_str(), somebody, somebody), 0);
@@ -95,13 +95,13 @@ protected:
     const TemporaryDirectory directory;
 };
 
-TEST_P(ReplacementByAnother, GivesTheRightsOfTheGroupToNoOther) {
+TEST_P(ReplacementByAnother, GrantsTheRightsOfTheGroupToNoOther) {
     const struct stat status = statusAfterReplacement(directory, {});
     EXPECT_NE(status.st_gid, group);
     EXPECT_EQ(status.st_mode & 07777U, GetParam().second);
 }
 
-TEST_P(ReplacementByAnother, KeepsAGroupOfItsOwnWithItsRights) {
+TEST_P(ReplacementByAnother, KeepsAGroupOfTheProcessWithItsRights) {
     const struct stat status = statusAfterReplacement(directory, {group});
     EXPECT_EQ(status.st_gid, group);
     EXPECT_EQ(status.st_mode & 07777U, GetParam().first);
@@ -111,7 +111,7 @@ INSTANTIATE_TEST_SUITE_P(Modes, ReplacementByAnother,
                          testing::Values(std::pair<mode_t, mode_t>{0640, 0600}, std::pair<mode_t, mode_t>{0664, 0604},
                                          std::pair<mode_t, mode_t>{0606, 0600}, std::pair<mode_t, mode_t>{0600, 0600}));
 
-TEST(ReplacementFile, IsItsOwnersAloneWhenItIsNew) {
+TEST(ReplacementFile, HasMode0600IfItIsNew) {
     const testsupport::Umask none(0);
     const TemporaryDirectory directory;
     replaceFile(directory.file("file"), "new");
@@ -119,7 +119,7 @@ TEST(ReplacementFile, IsItsOwnersAloneWhenItIsNew) {
     EXPECT_EQ(modeOf(directory.file("file")), 0600U);
 }
 
-TEST(ReplacementFile, LeavesAReaderOfTheOldContentUndisturbed) {
+TEST(ReplacementFile, DoesNotDisturbAReaderOfTheOldContent) {
     const TemporaryDirectory directory;
     std::ifstream reader(directory.write("file", "old"));
     replaceFile(directory.file("file"), "new");
@@ -128,7 +128,7 @@ TEST(ReplacementFile, LeavesAReaderOfTheOldContentUndisturbed) {
     EXPECT_EQ(line, "old");
 }
 
-TEST(ReplacementFile, ReplacesWhatASymbolicLinkLeadsTo) {
+TEST(ReplacementFile, ReplacesTheTargetOfASymbolicLink) {
     const TemporaryDirectory directory;
     directory.write("file", "old");
     std::filesystem::create_symlink("file", directory.file("link"));
@@ -137,7 +137,7 @@ TEST(ReplacementFile, ReplacesWhatASymbolicLinkLeadsTo) {
     EXPECT_EQ(directory.read("file"), "new");
 }
 
-TEST(ReplacementFile, SaysWhyItCannotBeMade) {
+TEST(ReplacementFile, ReportsWhyItCannotBeCreated) {
     const TemporaryDirectory directory;
     try {
         replaceFile(directory.file("none/file"), "new");
@@ -147,8 +147,8 @@ TEST(ReplacementFile, SaysWhyItCannotBeMade) {
     }
 }
 
-// What is left behind is deleted when the package is purged, and nothing else that lies there.
-TEST(ReplacementFile, HasANameUntilItTakesItsPlaceThatNobodyGivesAnother) {
+// Purging the package deletes files with this name, and no others.
+TEST(ReplacementFile, HasADistinctTemporaryName) {
     const TemporaryDirectory directory;
     const auto replaceAndBeKilled = [&] {
         const struct rlimit nothing {};
@@ -161,7 +161,7 @@ TEST(ReplacementFile, HasANameUntilItTakesItsPlaceThatNobodyGivesAnother) {
     EXPECT_THAT(left, testing::MatchesRegex("\\.asset\\.dat\\.new-......"));
 }
 
-TEST(ReplacementFile, LeavesTheOldOneWhenItFails) {
+TEST(ReplacementFile, KeepsTheOldFileIfItFails) {
     const TemporaryDirectory directory;
     std::filesystem::create_directory(directory.file("target"));
     directory.write("target/inside", "old");

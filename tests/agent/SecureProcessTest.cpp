@@ -1,4 +1,4 @@
-// A process that runs with rights that its caller has not: nothing that the caller sets may lead it elsewhere.
+// A process with more rights than its caller: it must ignore the caller's environment.
 
 #include "agent/Probe.h"
 
@@ -22,7 +22,7 @@ using testing::Not;
 
 namespace {
 
-/** A group that is not the process's own and that it may give files to; its own where there is none. */
+/** A supplementary group of the process; its primary group if there is none. */
 gid_t otherGroup() {
     if (::geteuid() == 0) {
         return ::getegid() + 1;
@@ -49,7 +49,7 @@ public:
     const std::string file;
 };
 
-/** A variable of this process's environment, and of those that it starts, as long as this lives. */
+/** Sets an environment variable of this process and its children for the lifetime of the object. */
 class Variable {
 public:
     Variable(const char* itsName, const char* value) : name(itsName) { ::setenv(name, value, 1); }
@@ -74,7 +74,7 @@ std::string outputOf(const std::string& command) {
 
 }  // namespace
 
-TEST(SecureProcess, TakesNoConfigurationFromItsCaller) {
+TEST(SecureProcess, IgnoresTheCallersConfiguration) {
     const gid_t group = otherGroup();
     if (group == ::getegid()) {
         GTEST_SKIP() << "this user has one group only";
@@ -90,7 +90,7 @@ TEST(SecureProcess, TakesNoConfigurationFromItsCaller) {
     EXPECT_THAT(result.output, Not(HasSubstr("/callers/")));
 }
 
-TEST(SecureProcess, TakesNoPlacesOfTheObjectManagersFilesFromItsCaller) {
+TEST(SecureProcess, IgnoresTheCallersPathsOfObjectManagerFiles) {
     const gid_t group = otherGroup();
     if (group == ::getegid()) {
         GTEST_SKIP() << "this user has one group only";
@@ -108,7 +108,7 @@ TEST(SecureProcess, TakesNoPlacesOfTheObjectManagersFilesFromItsCaller) {
 }
 
 /** cimhost is not among them: what reads its command line could read variables, had its options any. */
-TEST(SecureProcess, ReadsNoVariableWithoutLookingAtItsRights) {
+TEST(SecureProcess, ReadsVariablesOnlyWithSecureGetenv) {
     std::istringstream libraries(SHIPPED_LIBRARIES);
     for (std::string library; std::getline(libraries, library, ':');) {
         const std::string symbols = outputOf("nm --dynamic --undefined-only '" + library + "'");

@@ -12,14 +12,14 @@ TEST(Strings, AreUtf8WhenNarrowAndCodePointsWhenWide) {
               "\x7f\xC2\x80\xDF\xBF\xE0\xA0\x80\xEF\xBF\xBF\xF0\x90\x80\x80\xF4\x8F\xBF\xBF");
 }
 
-TEST(Strings, KeepEmptyTextsAndNulCharacters) {
+TEST(Strings, KeepEmptyStringsAndNulCharacters) {
     EXPECT_EQ(make_wstring(""), L"");
     EXPECT_EQ(make_string(std::wstring()), "");
     EXPECT_EQ(make_wstring(std::string("a\0b", 3)), std::wstring(L"a\0b", 3));
     EXPECT_EQ(make_string(std::wstring(L"a\0b", 3)), std::string("a\0b", 3));
 }
 
-TEST(Strings, CarryBytesThatAreNotUtf8ThereAndBack) {
+TEST(Strings, RoundTripInvalidUtf8) {
     std::string bytes;
     for (int byte = 0; byte < 256; ++byte) {
         bytes += static_cast<char>(byte);
@@ -31,13 +31,13 @@ TEST(Strings, CarryBytesThatAreNotUtf8ThereAndBack) {
     EXPECT_EQ(make_wstring("caf\xE9").size(), 4U);
 }
 
-TEST(Strings, ReplaceWideElementsThatAreNoCodePoints) {
+TEST(Strings, ReplaceInvalidCodePoints) {
     EXPECT_EQ(make_string(std::wstring(1, static_cast<wchar_t>(0xD800))), "\xEF\xBF\xBD");
     EXPECT_EQ(make_string(std::wstring(1, static_cast<wchar_t>(0x110000))), "\xEF\xBF\xBD");
     EXPECT_EQ(make_string(std::wstring(1, static_cast<wchar_t>(-1))), "\xEF\xBF\xBD");
 }
 
-TEST(Strings, CopyNarrowTexts) {
+TEST(Strings, CopyNarrowStrings) {
     EXPECT_EQ(make_string("/var/lib/"), "/var/lib/");
     EXPECT_EQ(make_string(static_cast<const char*>(nullptr)), "");
 }

@@ -21,7 +21,7 @@ using testing::SizeIs;
 
 namespace {
 
-/** A log's service, which reads when it is told to. */
+/** The service of a log, which reads only on request. */
 class Service {
 public:
     explicit Service(const std::string& itsPath)
@@ -35,7 +35,7 @@ public:
     Service(const Service&) = delete;
     Service& operator=(const Service&) = delete;
 
-    /** All messages that wait for it. */
+    /** All messages in its queue. */
     std::vector<std::string> readAll() const {
         std::vector<std::string> messages;
         std::string content(2 * RZLog::longestText, ' ');
@@ -78,7 +78,7 @@ protected:
         sink.write({RZLog::Channel::log, level, "Ostrel.Test", "getLessor", "Lease.cpp", 42, text});
     }
 
-    /** Writes more than the service's queue takes. @return how many are lost */
+    /** Writes more records than the service's queue holds. @return how many are lost */
     std::size_t overfill(RZLog::Sink& sink) {
         constexpr std::size_t many = 5000;
         for (std::size_t number = 0; number < many; ++number) {
@@ -95,7 +95,7 @@ protected:
     std::optional<Service> service;
 };
 
-TEST_P(SystemLogs, DropRecordsWhenTheServiceReadsNothingAndSaySoWhenItReadsAgain) {
+TEST_P(SystemLogs, DropRecordsWhileTheServiceIsBusyAndReportTheirCount) {
     const auto sink = open();
     const std::string lost = std::to_string(overfill(*sink));
     write(*sink, "the next");
@@ -105,14 +105,14 @@ TEST_P(SystemLogs, DropRecordsWhenTheServiceReadsNothingAndSaySoWhenItReadsAgain
     EXPECT_THAT(service->readAll(), ElementsAre(HasSubstr("the last"))) << "it is said once";
 }
 
-TEST_P(SystemLogs, DoNotSaySoWhereTheOwnLoggerIsToBeQuiet) {
+TEST_P(SystemLogs, DoNotReportTheCountIfTheOwnLoggerIsSilent) {
     const auto sink = open(0);
     overfill(*sink);
     write(*sink, "the next");
     EXPECT_THAT(service->readAll(), ElementsAre(HasSubstr("the next")));
 }
 
-TEST_P(SystemLogs, FindAServiceThatIsStartedAnew) {
+TEST_P(SystemLogs, FindARestartedService) {
     const auto sink = open();
     write(*sink, "one");
     EXPECT_THAT(service->readAll(), SizeIs(1));
@@ -133,7 +133,7 @@ TEST_P(SystemLogs, DropRecordsWithoutAService) {
     EXPECT_FALSE(std::filesystem::exists(path)) << "nobody makes it";
 }
 
-TEST_P(SystemLogs, CutWhatIsTooLongBetweenCharacters) {
+TEST_P(SystemLogs, TruncateLongRecordsBetweenCharacters) {
     const auto sink = open();
     for (const char* shift : {"", "x"}) {
         std::string accents = shift;

@@ -27,7 +27,7 @@ protected:
 
 }  // namespace
 
-TEST_F(TableReaderTest, GivesValuesOfTheRightKind) {
+TEST_F(TableReaderTest, ReturnsValuesOfTheRightKind) {
     TableReader table = read("text = 'x'\nflag = true\nnumber = 7\n");
     EXPECT_EQ(table.string("text"), "x");
     EXPECT_EQ(table.flag("flag"), true);
@@ -35,7 +35,7 @@ TEST_F(TableReaderTest, GivesValuesOfTheRightKind) {
     EXPECT_THAT(problems, IsEmpty());
 }
 
-TEST_F(TableReaderTest, GivesNothingForAnAbsentKeyAndThatIsNoProblem) {
+TEST_F(TableReaderTest, ReturnsNoValueForAnAbsentKey) {
     TableReader table = read("");
     EXPECT_EQ(table.string("text"), std::nullopt);
     EXPECT_EQ(table.nonEmptyString("text"), std::nullopt);
@@ -46,7 +46,7 @@ TEST_F(TableReaderTest, GivesNothingForAnAbsentKeyAndThatIsNoProblem) {
     EXPECT_THAT(problems, IsEmpty());
 }
 
-TEST_F(TableReaderTest, NotesValuesOfTheWrongKind) {
+TEST_F(TableReaderTest, ReportsValuesOfTheWrongKind) {
     TableReader table = read("text = 1\nempty = ''\nflag = 'yes'\nnumber = 11\nword = 'x'\ntable = 1\ntables = [1]\n");
     EXPECT_EQ(table.string("text"), std::nullopt);
     EXPECT_EQ(table.nonEmptyString("empty"), std::nullopt);
@@ -75,7 +75,7 @@ TEST_F(TableReaderTest, NamesKeysOfInnerTablesInFull) {
                                       "configuration key outer.list[1].key must be a string; ignored"));
 }
 
-TEST_F(TableReaderTest, NotesKeysThatNobodyAskedFor) {
+TEST_F(TableReaderTest, ReportsUnknownKeys) {
     TableReader table = read("known = 'x'\nunknown = 'y'\n[section]\n");
     table.string("known");
     table.rejectUnknownKeys();
@@ -83,13 +83,13 @@ TEST_F(TableReaderTest, NotesKeysThatNobodyAskedFor) {
                                       "configuration key unknown is unknown; ignored"));
 }
 
-TEST_F(TableReaderTest, GivesAllTextsAndNotesTheOthers) {
+TEST_F(TableReaderTest, ReturnsAllStringsAndReportsOtherValues) {
     TableReader table = read("b = 'second'\na = ''\nc = 3\n");
     EXPECT_THAT(table.allStrings(), ElementsAre(Pair("a", ""), Pair("b", "second")));
     EXPECT_THAT(problems, ElementsAre("configuration key c must be a string; ignored"));
 }
 
-TEST_F(TableReaderTest, TakesAnEmptyArrayForNoTables) {
+TEST_F(TableReaderTest, TreatsAnEmptyArrayAsNoTables) {
     TableReader table = read("tables = []\n");
     EXPECT_THAT(table.tables("tables"), IsEmpty());
     EXPECT_THAT(problems, IsEmpty());

@@ -10,7 +10,7 @@
 
 namespace agent_test {
 
-/** A directory of a test's own, removed with everything in it at the end. */
+/** A temporary directory, removed with its content by the destructor. */
 class TemporaryDirectory {
 public:
     TemporaryDirectory() : name(testing::TempDir() + "agent-XXXXXX") {

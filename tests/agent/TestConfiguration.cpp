@@ -38,7 +38,7 @@ type = 40
 path = "/nameless"
 )";
 
-/** Configures the agent of this process before anybody asks for it, and cleans up afterwards. */
+/** Configures the agent of this process before its first use, and cleans up afterwards. */
 class Configuration : public testing::Environment {
 public:
     void SetUp() override {

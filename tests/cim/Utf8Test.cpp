@@ -25,7 +25,7 @@ class Utf8Decoding : public testing::TestWithParam<Case> {};
 
 }  // namespace
 
-TEST_P(Utf8Decoding, GivesTheFirstCharacter) {
+TEST_P(Utf8Decoding, DecodesTheFirstCharacter) {
     const Case& expected = GetParam();
     const Utf8Character character = firstCharacter(expected.text);
     EXPECT_EQ(character.codePoint, expected.codePoint) << expected.description;
