@@ -1,12 +1,11 @@
 #!/usr/bin/env python3
-"""Runs the benchmarks and puts their figures into docs/performance.md and its picture, docs/performance.svg.
+"""Runs the benchmarks and writes their figures, docs/performance-figures.md, and the picture docs/performance.svg.
 
 usage: bench/report.py BUILD_DIRECTORY [--min-time SECONDS] [--runs N] [--print]
 
 gnuplot draws the picture (Debian package gnuplot-nox).
 
-The figures stand between two marker lines of the document and replace what was there; with --print
-they go to standard output and the document stays as it is. Nothing is written unless every
+With --print the figures go to standard output, and no file is written. Nothing is written unless every
 benchmark ran and every answer was right. A limit that can be kept, and was missed, is a failure.
 """
 
@@ -19,13 +18,12 @@ import sys
 import tempfile
 
 HERE = pathlib.Path(__file__).resolve().parent
-DOCUMENT = HERE.parent / "docs" / "performance.md"
+DOCUMENT = HERE.parent / "docs" / "performance-figures.md"
 PICTURE = HERE.parent / "docs" / "performance.svg"
 INSTRUCTIONS = HERE / "instructions.json"
 PLOTTED = ("Load", "EnumInstances", "EnumInstanceNames", "GetInstance.middle", "ModifyInstance")
 PLOTTED_CLASS = "VELKO_Lease"
-BEGIN = "<!-- figures of bench/report.py begin -->\n"
-END = "<!-- figures of bench/report.py end -->\n"
+HEAD = "<!-- Written by script/benchmark. -->\n\n# Performance figures\n\n"
 SIDES = ("provider", "floor")
 # Loading is timed by itself, all else with the floor in turn.
 TIMED = "^Load/|/both/|/gate/"
@@ -33,7 +31,7 @@ TIMED = "^Load/|/both/|/gate/"
 LARGEST = (("Enumerating leases", "EnumInstances", "the object manager's instances"),
            ("Enumerating their names", "EnumInstanceNames", "the object manager's paths"),
            ("Loading leases", "Load", "reading the file"),
-           ("Rewriting their file", "ModifyInstance", "a system call a line"))
+           ("Rewriting their file", "ModifyInstance", "one system call per line"))
 
 
 def run(program, min_time):
@@ -103,7 +101,7 @@ def requests_table(cases):
             rows.append([operation, class_name, f"{size:,}", *(time_text(times[side]) for side in SIDES),
                          ratio_text(times), *([f"{count:,}" for count in counts] or ["", ""]), *own])
     return table(["Request", "Class", "Records", "Provider", "Floor", "Ratio", "Instructions", "of the floor",
-                  "own, a record"], rows)
+                  "own, per record"], rows)
 
 
 def gate_table(cases):
@@ -134,7 +132,7 @@ def growth_table(cases):
         if largest > 100000:
             cells = [cell for side in (*SIDES, "own") for cell in growth_cells(by_size, side)]
             rows.append([operation, class_name, *cells])
-    head = ["of 10,000", "of 1,000,000", "growth"]
+    head = ["with 10,000", "with 1,000,000", "growth"]
     return table(["Request", "Class", *head, f"floor: {head[0]}", *head[1:], f"provider's own: {head[0]}", *head[1:]],
                  rows)
 
@@ -155,8 +153,8 @@ def memory_table(results):
         record = memory - pieces
         cells = (text, memory, record, pieces, one["table_per_record"] - record)
         rows.append([class_name, f"{size:,}", *(f"{cell:.0f}" for cell in cells), f"{memory / text:.2f}"])
-    return table(["Class", "Records", "Bytes a record in the file", "in memory", "of it the record", "of it its texts",
-                  "reserved besides", "Ratio of memory to file"], rows)
+    return table(["Class", "Records", "Bytes per record in the file", "in memory", "of that the record",
+                  "of that its strings", "also reserved", "Ratio of memory to file"], rows)
 
 
 def time_a_record(by_size, side, size):
@@ -187,21 +185,21 @@ def limits_of(cases, results):
     added = leases["GetInstance.middle"][10]["gated"] - leases["GetInstance.middle"][10]["alone"]
     counted = json.loads(INSTRUCTIONS.read_text(encoding="utf-8"))
     counted_part = counted["EnumInstances/VELKO_Lease/gate/1000"] / counted["EnumInstances/VELKO_Lease/provider/1000"]
-    limits = [Limit("Enumerating 1,000 leases, in floors", enumeration["provider"] / enumeration["floor"], 3,
+    limits = [Limit("Enumerating 1,000 leases, relative to the floor", enumeration["provider"] / enumeration["floor"], 3,
                     "the broker calls, which the floor makes too"),
-              Limit("Getting one of 10,000 leases, nanoseconds a record", max(scans), 100, "one walk over the table")]
-    limits += [Limit(f"{what}: time a record of 1,000,000, in that of 10,000", growth(leases[operation]), 1.5,
+              Limit("Getting one of 10,000 leases, nanoseconds per record", max(scans), 100, "one walk over the table")]
+    limits += [Limit(f"{what}: time per record with 1,000,000, relative to 10,000", growth(leases[operation]), 1.5,
                      f"{bound}; the floor: {growth(leases[operation], 'floor'):.2f}")
                for what, operation, bound in LARGEST]
-    limits += [Limit(f"Memory of {class_name} among 10,000, in bytes of its text",
+    limits += [Limit(f"Memory of {class_name} among 10,000, relative to its size in the file",
                      one["bytes_per_record"] / one["text_per_record"], 2,
-                     "the layout of a record, and a piece a longer text", False)
+                     "the record layout, and one allocation per longer string", False)
                for class_name, size, one in memories(results) if size == 10000]
-    limits += [Limit("The gate, enumerating 1,000 leases, added per cent of the time", 100 * gated, 5,
-                     "an answer is whole before it goes out"),
-               Limit("The same, of the instructions", 100 * counted_part, 5, "the same"),
-               Limit("The gate, getting one of 10 leases, added microseconds", added / 1e3, 10,
-                     "its turn and its own objects")]
+    limits += [Limit("Gate, enumerating 1,000 leases: added time in percent", 100 * gated, 5,
+                     "the answer is complete before it is returned"),
+               Limit("The same in instructions", 100 * counted_part, 5, "the same"),
+               Limit("Gate, getting one of 10 leases: added microseconds", added / 1e3, 10,
+                     "its lock and its objects")]
     return limits
 
 
@@ -241,26 +239,17 @@ def machine(context):
 def figures(cases, limits, results):
     return "\n".join([
         machine(results[0]["context"]),
-        "### Limits\n",
+        "## Limits\n",
         limits_table(limits),
-        "### Requests\n",
+        "## Requests\n",
         requests_table(cases),
-        "### The provider alone and behind the gate\n",
+        "## The provider alone and behind the gate\n",
         gate_table(cases),
-        "### Time a record with 1,000,000 records\n",
+        "## Time per record with 1,000,000 records\n",
         growth_table(cases),
-        "### Memory that the loaded records take\n",
+        "## Memory of the loaded records\n",
         memory_table(results),
     ])
-
-
-def replace_figures(text):
-    document = DOCUMENT.read_text(encoding="utf-8")
-    before, begin, rest = document.partition(BEGIN)
-    _, end, after = rest.partition(END)
-    if not begin or not end:
-        sys.exit(f"{DOCUMENT} has not the two marker lines")
-    DOCUMENT.write_text(before + begin + "\n" + text + "\n" + end + after, encoding="utf-8")
 
 
 def main():
@@ -281,7 +270,7 @@ def main():
         print(text)
     else:
         draw(cases)
-        replace_figures(text)
+        DOCUMENT.write_text(HEAD + text, encoding="utf-8")
     broken = [f"{limit.what}: {limit.measured:.3g}, at most {limit.at_most:g}" for limit in limits if limit.is_broken]
     if broken:
         sys.exit("Limits that can be kept were missed:\n" + "\n".join(broken))

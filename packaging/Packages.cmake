@@ -39,7 +39,7 @@ endfunction()
 
 # law_package(<component> <name> DESCRIPTION <summary and lines> [DEPENDS <packages>] [SECTION <section>]
 #             [DOCUMENTS <names>])
-# What the package of a component is called and says of itself, and which files and directories of docs/ it brings. Its
+# Name, description and documents (in docs/) of a component's package. Its
 # control files are in debian/<component>; every package has copyright and changes, and says why it is not as lintian
 # wants it.
 macro(law_package component name)
@@ -69,20 +69,19 @@ set(package_of_cimhost.md cimhost)
 file(GLOB linked CONFIGURE_DEPENDS RELATIVE ${PROJECT_SOURCE_DIR}/docs ${PROJECT_SOURCE_DIR}/docs/*.md)
 
 # law_install_document(<name> <package> <component>)
-# The links of a page lead to where the packages have what they lead to in the sources.
+# Adapts the links of a document to the places of the packages. CONTRIBUTING.md is in none of them.
 function(law_install_document name package component)
     set(directory ${CMAKE_INSTALL_DATADIR}/doc/${package})
     set(document ${PROJECT_SOURCE_DIR}/docs/${name})
-    if(IS_DIRECTORY ${document})
-        install(DIRECTORY ${document} DESTINATION ${directory} COMPONENT ${component})
-        return()
-    elseif(NOT name MATCHES "\\.md$")
+    if(NOT name MATCHES "\\.md$")
         install(FILES ${document} DESTINATION ${directory} COMPONENT ${component})
         return()
     endif()
     set_property(DIRECTORY APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS ${document})
     file(READ ${document} text)
     string(REPLACE "](../README.md" "](README.md" text "${text}")
+    string(REPLACE "](docs/" "](" text "${text}")
+    string(REGEX REPLACE "\\[([^]]*)\\]\\(CONTRIBUTING[.]md[^)]*\\)" "\\1" text "${text}")
     foreach(other IN LISTS linked)
         set(home lease-warranty-provider)
         if(DEFINED package_of_${other})
@@ -110,8 +109,8 @@ function(law_install_overrides component name)
 endfunction()
 
 law_package(provider lease-warranty-provider
-    DOCUMENTS classes classes.md data-files.md gate.md log-records.md messages.md object-managers.md performance.md
-        performance.svg security.md ../README.md
+    DOCUMENTS architecture.md architecture.svg classes.md data-files.md gate.md log-records.md messages.md
+        object-managers.md performance.md performance-figures.md performance.svg security.md ../README.md
     DEPENDS "ostrel-reference-agent (>= ${PROJECT_VERSION}) | ostrel-agent"
     DESCRIPTION "CMPI provider for the leases and warranties of a computer
 A library that a CIM object manager (SFCB, OpenPegasus) loads, and that

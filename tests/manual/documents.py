@@ -34,6 +34,16 @@ def all_blocks(language=None, mark=None):
             if language in (None, block.language) and mark in (None, block.mark)]
 
 
+def rows(document, heading=""):
+    """The rows of the tables below a heading, or of all tables: lists of cells without their code marks."""
+    text = document.read_text("utf-8")
+    if heading:
+        text = re.split(rf"^#+ {re.escape(heading)}$", text, 1, re.M)[1]
+        text = re.split(r"^#", text, 1, re.M)[0]
+    lines = re.findall(r"^\| (`.*) \|$", text, re.M)
+    return [[cell.replace("`", "") for cell in line.split(" | ")] for line in lines]
+
+
 def without_tested_blocks(document):
     """What is left of a document without the blocks that say who runs them, and those that are illustrations."""
     text = document.read_text("utf-8")

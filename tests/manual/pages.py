@@ -1,5 +1,6 @@
-"""Reads the manual pages: the terms of their lists, their columns and their examples."""
+"""Finds the manual pages, and reads those in docs/man: the terms of their lists and their examples."""
 
+import gzip
 import pathlib
 import re
 
@@ -7,8 +8,18 @@ ROOT = pathlib.Path(__file__).resolve().parent.parent.parent
 DIRECTORY = ROOT / "docs" / "man"
 
 
-def all_pages():
-    return sorted(path for path in DIRECTORY.iterdir() if not path.name.startswith("."))
+def all_pages(directory):
+    """The pages of a build tree or an installation."""
+    return sorted((directory / "share" / "man").glob("man?/*"))
+
+
+def name_of(path):
+    return path.name.removesuffix(".gz")
+
+
+def source_of(path):
+    with (gzip.open if path.suffix == ".gz" else open)(path, "rt", encoding="utf-8") as page:
+        return page.read()
 
 
 class Page:
@@ -36,16 +47,6 @@ class Page:
     def words(self, macro, heading=""):
         """The words behind a macro in the terms, such as those of commands behind Cm."""
         return [word for term in self.terms(heading) for word in re.findall(rf"\b{macro} (?!\|)(\S+)", term)]
-
-    def rows(self):
-        """The columns of those lists that have them, a list of rows each."""
-        lists = []
-        for line in self.lines:
-            if line.startswith(".Bl "):
-                lists.append([])
-            elif line.startswith(".It ") and " Ta " in line:
-                lists[-1].append([re.sub(r"^Li ", "", cell) for cell in line[4:].split(" Ta ")])
-        return [rows for rows in lists if rows]
 
     def examples(self):
         """The texts that are shown as they are."""
