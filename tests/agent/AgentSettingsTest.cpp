@@ -148,7 +148,7 @@ properties = { name = "a", "65536" = "b", "10" = 3, "-1" = "c", "12x" = "d", "11
     EXPECT_THAT(settings.nodes[0].properties, ElementsAre(Pair(11U, "good")));
     const std::string key = "configuration key instrumentation.node[0].properties.";
     EXPECT_THAT(problems, testing::UnorderedElementsAre(key + "name is not a property number; ignored",
-                                                        key + "65536 is no property number; ignored",
+                                                        key + "65536 is not a property number; ignored",
                                                         key + "10 must be a string; ignored",
                                                         key + "-1 is not a property number; ignored",
                                                         key + "12x is not a property number; ignored"));
