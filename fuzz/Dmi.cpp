@@ -2,7 +2,7 @@
 #include "Target.h"
 
 #include "KO/NodeLexicon.h"
-#include "configuration/Utf8.h"
+#include "cim/Utf8.h"
 #include "framework/ComputerDiscovery.h"
 
 #include <algorithm>
@@ -65,7 +65,7 @@ void requireTidy(std::string_view text, const std::string& what) {
     require(!text.empty() && text.front() != ' ' && text.back() != ' ', what + " has a text without outer blanks");
     require(text.find("  ") == std::string_view::npos, what + " has single blanks only");
     while (!text.empty()) {
-        const Agent::Utf8Character character = Agent::firstCharacter(text);
+        const cim::Utf8Character character = cim::firstCharacter(text);
         const bool isControl = character.codePoint < ' ' || (character.codePoint >= 0x7f && character.codePoint < 0xa0);
         require(character.valid && !isControl, what + " has no controls and is UTF-8");
         text.remove_prefix(character.length);

@@ -84,6 +84,13 @@ std::string formattedRaw(const Response& response, const Arguments& arguments) {
                                             : text::format(response.providers, arguments.style);
 }
 
+/** The status of the providers themselves: OK also if the object manager makes an error of what they returned. */
+Status rawStatus(const Response& response) {
+    const auto hasSucceeded = [](const ProviderResponse& each) { return each.status.ok() && each.crashReason.empty(); };
+    const bool haveAll = std::all_of(response.providers.begin(), response.providers.end(), hasSucceeded);
+    return haveAll && !response.providers.empty() ? Status{} : response.status;
+}
+
 /** The hint for an unknown class, namespace or instance; empty for other codes. */
 std::string hintFor(int code, const Request& request, const std::vector<ProviderRegistration>& registrations) {
     const std::string className = request.filter.associationClass.value_or(request.path.className);
@@ -114,7 +121,7 @@ CommandResult runRequest(const Arguments& arguments, const SearchPaths& paths, c
         ObjectManager manager(managerOptions(paths, schema, extension), registry);
         const Response response = manager.perform(request);
         if (arguments.raw) {
-            return {formattedRaw(response, arguments), response.status};
+            return {formattedRaw(response, arguments), rawStatus(response)};
         }
         return {response.ok() ? formatted(response, request.operation, arguments) : "", response.status, "",
                 hintFor(response.status.rc, request, registrations)};

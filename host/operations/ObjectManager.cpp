@@ -113,7 +113,7 @@ Response ObjectManager::perform(Request request) {
     if (pool.isStopped()) {
         return Response::failed({CMPI_RC_ERR_FAILED, stoppingText});
     }
-    if (request.operation == Operation::execQuery || request.operation > Operation::referenceNames) {
+    if (request.operation > Operation::referenceNames) {
         return notSupported(request.operation);
     }
     if (!providers.knowsNameSpace(request.path.nameSpace)) {

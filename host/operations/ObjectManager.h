@@ -48,7 +48,7 @@ public:
      *
      * @return the results, or a status that is not OK, with a message: that of mapResponses(), or
      * CMPI_RC_ERR_INVALID_NAMESPACE and CMPI_RC_ERR_INVALID_CLASS when no provider is registered;
-     * CMPI_RC_ERR_NOT_SUPPORTED for queries, methods and single properties
+     * CMPI_RC_ERR_NOT_SUPPORTED for methods and single properties
      * @throws LibraryError when a provider cannot be loaded, unless the behaviour has a status for it
      */
     Response perform(Request request) override;
