@@ -26,28 +26,36 @@ private:
     static constexpr CMPIStatus ok{CMPI_RC_OK, nullptr};
     static constexpr CMPIStatus notSupported{CMPI_RC_ERR_NOT_SUPPORTED, nullptr};
 
-    static inline CMPIResultFT functions{CMPIVersion200,
-                                         [](CMPIResult*) { return ok; },
-                                         [](const CMPIResult*, CMPIStatus* rc) {
-                                             if (rc != nullptr) {
-                                                 *rc = notSupported;
-                                             }
-                                             return static_cast<CMPIResult*>(nullptr);
-                                         },
-                                         [](const CMPIResult*, const CMPIValue*, CMPIType) { return notSupported; },
-                                         [](const CMPIResult* result, const CMPIInstance* instance) {
-                                             of(result).instances.push_back(instance);
-                                             return ok;
-                                         },
-                                         [](const CMPIResult* result, const CMPIObjectPath* path) {
-                                             of(result).paths.push_back(path);
-                                             return ok;
-                                         },
-                                         [](const CMPIResult* result) {
-                                             of(result).isDone = true;
-                                             return ok;
-                                         },
-                                         [](const CMPIResult*, const CMPIError*) { return notSupported; }};
+    static CMPIStatus release(CMPIResult*) { return ok; }
+
+    static CMPIResult* clone(const CMPIResult*, CMPIStatus* rc) {
+        if (rc != nullptr) {
+            *rc = notSupported;
+        }
+        return nullptr;
+    }
+
+    static CMPIStatus returnData(const CMPIResult*, const CMPIValue*, CMPIType) { return notSupported; }
+
+    static CMPIStatus returnInstance(const CMPIResult* result, const CMPIInstance* instance) {
+        of(result).instances.push_back(instance);
+        return ok;
+    }
+
+    static CMPIStatus returnObjectPath(const CMPIResult* result, const CMPIObjectPath* path) {
+        of(result).paths.push_back(path);
+        return ok;
+    }
+
+    static CMPIStatus returnDone(const CMPIResult* result) {
+        of(result).isDone = true;
+        return ok;
+    }
+
+    static CMPIStatus returnError(const CMPIResult*, const CMPIError*) { return notSupported; }
+
+    static inline CMPIResultFT functions{CMPIVersion200, release,          clone,      returnData,
+                                         returnInstance, returnObjectPath, returnDone, returnError};
 };
 
 }  // namespace gate
