@@ -44,7 +44,7 @@ public:
         return provider->interfaces();
     }
 
-    /** The provider with a table of that many records: still loaded since the last such call, or anew. */
+    /** The provider with a table of that many records: still loaded since the last such call, or loaded again. */
     template <class Row>
     Interfaces loaded(std::size_t size) {
         const std::string wanted = Row::fileName + std::to_string(size);

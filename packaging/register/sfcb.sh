@@ -33,7 +33,7 @@ sfcb_unstage() {
     run sfcbunstage ${sfcb_directory:+-s "$sfcb_directory/stage"} "$@"
 }
 
-# Makes the repository anew from what is staged.
+# Makes the repository again from the staged files.
 sfcb_rebuild() {
     run sfcbrepos -f ${sfcb_directory:+-s "$sfcb_directory/stage" -r "$sfcb_directory/registration"}
 }

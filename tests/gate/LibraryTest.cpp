@@ -62,7 +62,7 @@ TEST_F(LibraryTest, AFactoryWithoutBrokerSaysSo) {
     EXPECT_EQ(status.rc, CMPI_RC_ERR_INVALID_PARAMETER);
     EXPECT_THAT(cimhost::statusFrom(status).message, HasSubstr("without a broker"));
     EXPECT_EQ(gate().createInstanceMI(nullptr, nullptr), nullptr);
-    EXPECT_THAT(create("L1"), isAnswered(1)) << "a good factory call mends it";
+    EXPECT_THAT(create("L1"), isAnswered(1)) << "a good factory call fixes it";
 }
 
 TEST_F(LibraryTest, FactoriesMayBeCalledAgainAndAgain) {

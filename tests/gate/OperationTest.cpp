@@ -18,7 +18,7 @@ protected:
     OperationTest() { agentEnvironment::clear(); }
     ~OperationTest() override { agentEnvironment::clear(); }
 
-    /** Who serves the classes starts anew with each request, over the same files. */
+    /** The library that serves the classes is loaded again for each request, over the same files. */
     cimhost::Response ask(const Row& row, Served served) {
         agentEnvironment::clear();
         writeRecords(recordsOfRows());

@@ -37,7 +37,7 @@ struct NoRoom {
 };
 
 /**
- * While one of these lives, files are opened to be written anew as its course says: '+' for one that is, '-' for one
+ * While one of these lives, files are opened to be rewritten as its course says: '+' for one that is, '-' for one
  * that is not; the last holds from then on.
  */
 struct Openings {

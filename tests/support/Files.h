@@ -28,7 +28,7 @@ private:
 /** The whole file, byte by byte. std::runtime_error when it cannot be read. */
 std::string readFile(const std::filesystem::path& file);
 
-/** Writes the file anew, byte by byte. std::runtime_error when it cannot be written. */
+/** Replaces the content of the file. Throws std::runtime_error if it cannot be written. */
 void writeFile(const std::filesystem::path& file, std::string_view content);
 
 }  // namespace testsupport
