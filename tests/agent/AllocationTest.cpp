@@ -20,6 +20,12 @@ void* operator new(std::size_t size) {
     throw std::bad_alloc();
 }
 
+// A sanitizer replaces this variant too, and the operators below could not release its memory.
+void* operator new(std::size_t size, const std::nothrow_t&) noexcept {
+    ++allocations;
+    return std::malloc(size);
+}
+
 void operator delete(void* memory) noexcept {
     std::free(memory);
 }

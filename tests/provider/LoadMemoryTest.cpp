@@ -1,4 +1,5 @@
-// Loading with little memory. The program replaces sysconf and operator new.
+// Loading with little memory. The program replaces sysconf and operator new, the variant that does not throw included:
+// memory from a sanitizer's own variant could not be released by the operator below.
 
 #include "RecordKinds.h"
 
@@ -34,6 +35,9 @@ void* operator new(std::size_t size) {
         throw std::bad_alloc();
     }
     return memory;
+}
+void* operator new(std::size_t size, const std::nothrow_t&) noexcept {
+    return size < refusedSize ? std::malloc(size == 0 ? 1 : size) : nullptr;
 }
 void operator delete(void* memory) noexcept {
     std::free(memory);
