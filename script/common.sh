@@ -1,4 +1,4 @@
-# What the scripts share: where the project is, and the packages they need. Sourced, not run.
+# Functions that the scripts share. Source this file; it changes to the project's directory.
 # shellcheck shell=bash
 
 root=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
@@ -18,7 +18,7 @@ usage() {
     sed -n '2,/^[^#]/{s/^# \{0,1\}//p}' "$0"
 }
 
-# For scripts without arguments of their own: prints the help, or refuses what was given.
+# For scripts without arguments: prints the help, or refuses the arguments.
 refuse_arguments() {
     [ $# -eq 0 ] && return
     case $1 in
@@ -31,7 +31,7 @@ refuse_arguments() {
     exit 2
 }
 
-# The packages of some stages that are not installed, one a line.
+# Prints the packages of some stages that are not installed, one per line.
 missing_packages() {
     local stage package
     for stage in "$@"; do
@@ -51,7 +51,7 @@ as_root() {
     fi
 }
 
-# Installs what stages need and the system lacks. Without anything to install, nobody has to be root.
+# Installs the missing packages of some stages. Needs root only if there are any.
 install_packages() {
     local packages
     command -v dpkg-query >/dev/null || fail "this system has no dpkg; script/packages lists what the build needs"
@@ -59,7 +59,7 @@ install_packages() {
     [ "${#packages[@]}" -gt 0 ] || return 0
     heading "Installing ${packages[*]}"
     if ! as_root true; then
-        fail "packages are missing, and neither root nor sudo is at hand to install them. Install by hand:
+        fail "packages are missing, and installing them needs root or sudo. Install them by hand:
     apt-get install --no-install-recommends ${packages[*]}"
     fi
     as_root apt-get update -qq
@@ -75,20 +75,20 @@ build() {
     cmake --build --preset "$preset" --parallel "$(nproc)" ${1:+--target "$@"}
 }
 
-# The C and C++ files of the project, each ended by a null character.
+# Prints the paths of the project's C and C++ files, each terminated by a null character.
 source_files() {
     git ls-files -z -- '*.h' '*.hpp' '*.c' '*.cpp'
 }
 
-# The shell scripts of the project, likewise.
+# Prints the paths of the project's shell scripts in the same form.
 shell_scripts() {
     git ls-files -z | xargs -0 awk '
         (FNR == 1 && /^#!.*sh$/) || (FNR == 2 && /shellcheck shell=/) { printf "%s%c", FILENAME, 0 }
         FNR == 2 { nextfile }'
 }
 
-# test_programs PRESET [WRAPPER...]: runs the test programs of a built preset, each whole and under the
-# wrapper. Where starting a process is dear, a process a test, as in script/test, takes too long.
+# test_programs PRESET [WRAPPER...]: runs each test program of a built preset in one process, under the
+# wrapper. script/test uses a process per test, which takes too long if processes start slowly.
 test_programs() {
     local preset=$1 directory=build/programs-$1
     shift

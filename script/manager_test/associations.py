@@ -8,7 +8,7 @@ COMPUTER = "VELKO_ComputerSystem"
 
 
 def associator_rows(run, cls, near, far):
-    """Options of a request from one end of the association to the other, and whether it finds something."""
+    """Yields the options of requests from one end of the association to the other, and whether they find something."""
     yield {"ac": cls.name}, True
     if run.is_gate:
         exact = {"ac": cls.name, "arc": far.reference_class, "ar": near.name, "arr": far.name}
@@ -26,7 +26,7 @@ def reference_rows(cls, near, far):
 
 
 def check_rows(run, operations, path, rows, expected):
-    """The operations for names and for instances find the expected paths, with the options of each row."""
+    """Checks that the operations for names and for instances find the expected paths, with the options of each row."""
     for options, finds in rows:
         names, listed = (run.ask(operation, path, **options) for operation in operations)
         for response in (names, listed):

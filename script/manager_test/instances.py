@@ -8,7 +8,7 @@ from .wbemcli import Path, assigned
 RECORDS = ("VELKO_Lease", "VELKO_Warranty")
 NEVER_EMPTY = ("VELKO_OstrelAgent", "VELKO_AssetIDDetails", "VELKO_ComputerSystem")
 
-# The ends are letters or digits of ASCII: some object managers cut off others.
+# They begin and end with ASCII letters: some object managers remove other characters at the ends.
 IDENTIFIERS = ["with blanks inside", "Jürgen & Söhne <\"it's\"> 日本 Ltd", "a,b=c;d:e/f.g\\h"]
 VALUES = {
     "string": ["ACME Leasing Co", "Jo's \"Müller & Söhne\", <日本 €>; 5 % = {a} \\ [b] #1", ""],
@@ -18,10 +18,10 @@ VALUES = {
 }
 INITIAL = {"string": "", "uint32": "0", "boolean": "false", "datetime": None}
 NO_DATE = "00000000000000.000000+000"
-# Values that some object managers do not return as they were sent.
+# Values that some object managers change.
 CUT = re.compile(r"^[^!-~]|[^!-~]$|[\x00-\x1f]")
 
-# Values that are not of the type, or that a record file does not give back. The gate refuses the latter, unless the
+# Values of the wrong type, and strings that a record file changes. The gate refuses these strings unless the
 # agent's configuration permits them.
 WRONG = {"uint32": ["-1", "4294967296", "many"], "boolean": ["perhaps"], "datetime": ["yesterday"],
          "string": ["under_score", "*", "x"]}
@@ -33,7 +33,7 @@ CONSTANT = {
     "VELKO_AssetIDDetails": {"Caption": "Asset ID Information", "Description": "Asset ID Information",
                              "AssetIDStringArea": "1024"},
 }
-# Properties that repeat another.
+# Properties that have the value of another.
 COPIES = {
     "VELKO_OstrelAgent": {"ProductName": "Name"},
     "VELKO_AssetIDDetails": {"DeploymentProfile": "ZOPMProfile", "DeploymentUpdateTime": "ZOPMUpdateTime"},
@@ -58,7 +58,7 @@ def has_qualifier(element, name):
 
 
 def check_response(run, response):
-    """wbemcli prints every object, and the paths are in the requested namespace."""
+    """Checks that wbemcli prints every object, and that the paths are in the requested namespace."""
     run.check(f"{response.request}: printed objects", response.printed, len(response.objects))
     run.check(f"{response.request}: other namespaces", response.namespaces - {run.client.namespace}, set())
 
@@ -81,7 +81,7 @@ def check_reading(run, cls):
 
 
 def check_instance(run, cls, instance):
-    """The instance agrees with its class and its path."""
+    """Checks an instance against its class and its path."""
     path, values = instance.path, instance.values
     run.check(f"{path}: keys", sorted(dict(path.keys)), sorted(cls.keys))
     run.check(f"{path}: class of the instance", instance.class_name, cls.name)
@@ -107,7 +107,7 @@ def check_get(run, cls, instance):
     run.check(f"{response.request}: the values of ei", steady(next(iter(response.objects), None)), values)
     for name in cls.properties:
         response = run.ask("gi", instance.path, name)
-        # The gate returns only what is asked for, and the keys, which some object managers leave out.
+        # The gate returns only the requested property and the keys, which some object managers omit.
         received = {each: value for found in response.objects for each, value in steady(found).items()
                     if each == name or run.is_gate and each not in cls.keys}
         run.check(f"{response.request}: values", received, {name: values[name]} if name in values else {})
@@ -116,7 +116,7 @@ def check_get(run, cls, instance):
 
 
 def absent(path, key):
-    """Returns a path that names no instance: the key, or one of the path that is its value, has another value."""
+    """Returns a path without instance: the key has another value, or a key of its value if that is a path."""
     value = dict(path.keys)[key]
     return path.replaced(**{key: absent(value, value.keys[0][0]) if isinstance(value, Path) else "no such value"})
 
@@ -139,7 +139,7 @@ def check_refusals(run, cls):
 
 
 def check_records(run, cls):
-    """Records from their creation to their deletion."""
+    """Creates, reads and deletes records."""
     for identifier in (f"{run.identifier} {each} end" for each in IDENTIFIERS):
         created = run.create(cls.name, identifier)
         if not run.check(f"{cls.name} {identifier} is created", bool(created)):
@@ -149,7 +149,7 @@ def check_records(run, cls):
         for prop in cls.writable:
             run.check(f"{path}: initial {prop.name}", created.values.get(prop.name), INITIAL[prop.type])
         run.check(f"{path} is listed last", run.client.send("ein", cls.name).paths[-1:], [path])
-        if run.is_gate:  # The bare provider answers without an instance, which ends a process of some object managers.
+        if run.is_gate:  # The bare provider returns no instance, which crashes a process of some object managers.
             run.ask("ci", path, str(path).partition(".")[2], status="ALREADY_EXISTS")
         run.ask("di", path)
         run.ask("gi", path, status="NOT_FOUND")
@@ -163,11 +163,11 @@ def check_records(run, cls):
         run.ask("ci", missing, f'{name}="{value}"', status="INVALID_PARAMETER")
         created = steady(run.create(cls.name, f"{run.identifier} with values", **values))
         for name, value in values.items():
-            run.check(f"{cls.name}: {name} given at creation", created.get(name), value)
+            run.check(f"{cls.name}: {name} set at creation", created.get(name), value)
 
 
 def check_values(run, cls, path, properties):
-    """Each property takes each value, and no other property changes."""
+    """Checks that each property accepts each value, and that no other property changes."""
     current = run.find(path)
     for prop in properties:
         for value in VALUES[prop.type]:
@@ -177,21 +177,21 @@ def check_values(run, cls, path, properties):
 
 
 def check_values_and_restore(run, cls, path):
-    """Modifies the properties whose values can be restored, and restores them at the end."""
+    """Tests the properties whose values can be restored, and restores them at the end."""
     original = run.find(path)
     if not run.check(f"{path} is found", original is not None):
         return
     cut = [prop for prop in cls.writable if CUT.search(original.values.get(prop.name, ""))]
     for prop in cut:
-        run.report.note(f"{cls.name}.{prop.name}: modifications, since some object managers cut the ends of its value")
+        run.report.note(f"{cls.name}.{prop.name}: modifications, since some object managers change the ends of its value")
     if cut and not run.is_gate:  # wbemcli sends all values with each modification.
-        run.report.note(f"{cls.name}: modifications, since the bare provider would store such values as they are cut")
+        run.report.note(f"{cls.name}: modifications, since the bare provider would store the changed values")
         return
     run.cleanup.callback(restore, run, cls, original)
     lasting = [prop for prop in cls.writable if prop.type == "datetime" and prop.name not in original.values
                and run.client.modify(path, **{prop.name: NO_DATE}).code != 0]
     for prop in lasting:
-        run.report.note(f"{cls.name}.{prop.name}: modifications, since this object manager does not make it null again")
+        run.report.note(f"{cls.name}.{prop.name}: modifications, since this object manager cannot set it to null again")
     check_values(run, cls, path, [prop for prop in cls.writable if prop not in cut + lasting])
 
 
@@ -208,7 +208,7 @@ def without(values, names):
 
 
 def check_wrong_values(run, cls, path):
-    """A wrong value is refused or kept, and no other property changes."""
+    """Checks that a wrong value is refused or preserved, and that no other property changes."""
     for prop in cls.writable:
         for value in WRONG[prop.type] if run.is_gate or prop.type != "string" else []:
             before = steady(run.find(path))
@@ -227,7 +227,7 @@ def check_wrong_values(run, cls, path):
 
 
 def restore(run, cls, original):
-    """Gives the writable properties their original values."""
+    """Restores the original values of the writable properties."""
     current, values = steady(run.find(original.path)), steady(original)
     run.client.modify(original.path, **{prop.name: sendable(prop, values.get(prop.name)) for prop in cls.writable
                                         if prop.name in values or prop.name in current})
@@ -235,7 +235,7 @@ def restore(run, cls, original):
 
 
 def sendable(prop, value):
-    """Returns the value to send for one that was read."""
+    """Returns the value that a request must send to restore a value that was read."""
     if value is None:
         return NO_DATE if prop.type == "datetime" else ""
     return "" if value == "Null" and prop.name.startswith("Personalized") else value

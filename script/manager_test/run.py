@@ -1,4 +1,4 @@
-"""The results, and the state that all checks share."""
+"""The report of the checks, and the state that they share."""
 
 import contextlib
 import dataclasses
@@ -11,7 +11,7 @@ STATUS = {0: "OK", 1: "FAILED", 3: "INVALID_NAMESPACE", 4: "INVALID_PARAMETER", 
 
 
 class CannotRun(Exception):
-    """A condition of most checks is not met."""
+    """Raised if a precondition of most checks is not met."""
 
 
 class Report:
@@ -52,8 +52,8 @@ class Report:
 class Run:
     """@param client   sends the requests
     @param classes  by their names, from the MOF
-    @param is_gate  whether the gate is registered; otherwise the provider without it
-    @param place    InstanceID of records that belong to the computer, or None for the usual one"""
+    @param is_gate  whether the gate is registered, rather than the provider without it
+    @param place    InstanceID of records that belong to the computer, or None for the default"""
 
     def __init__(self, client, classes, report, is_gate, place):
         self.client = client
@@ -71,7 +71,7 @@ class Run:
         return gate if self.is_gate else bare
 
     def ask(self, *request, status="OK", namespace=None, **options):
-        """Sends a request and checks its status; several permitted ones are separated by bars."""
+        """Sends a request and checks its status; bars separate permitted statuses."""
         response = self.client.send(*request, namespace=namespace, **options)
         received = STATUS.get(response.code, str(response.code))
         expected = received if received in status.split("|") else status
@@ -79,13 +79,13 @@ class Run:
         return response
 
     def find(self, path):
-        """Returns the instance, or None."""
+        """Returns the instance with the path, or None."""
         response = self.client.get(path)
         return dataclasses.replace(response.objects[0], path=path) if response.objects else None
 
     def create(self, class_name, identifier, **values):
-        """Creates a record, which is deleted at the end, and returns it, or None. The response of the bare provider is
-        not checked: it is the instance, from which object managers make no usable path."""
+        """Creates a record that is deleted at the end. Returns it, or None. Does not check the response of the bare
+        provider: it is the instance, and object managers do not convert it to a usable path."""
         path = Path.of(class_name, InstanceID=identifier)
         self.cleanup.callback(self.delete_at_end, path)
         response = self.client.create(class_name, InstanceID=identifier, **values)
@@ -98,7 +98,7 @@ class Run:
         self.check(f"{path} is deleted at the end", self.find(path), None)
 
     def prepare(self, class_names):
-        """Creates a record of each class, and the one that belongs to the computer unless it exists."""
+        """Creates a record of each class and, unless it exists, the record that belongs to the computer."""
         self.report.begin("Preparation")
         if not self.place:
             assets = self.ask("ein", "VELKO_AssetIDDetails").paths
@@ -106,7 +106,7 @@ class Run:
         for name in class_names:
             created = self.create(name, self.identifier)
             if self.is_gate and self.report.total(False):
-                raise CannotRun("The gate does not answer as it should. If the provider is registered without it, use "
+                raise CannotRun("The gate's responses are wrong. If the provider is registered without the gate, use "
                                 "--provider bare.")
             tied = Path.of(name, InstanceID=self.place)
             if self.find(tied) or self.create(name, self.place):
@@ -114,11 +114,11 @@ class Run:
             if created:
                 self.records[name] = created.path
             else:
-                self.report.note(f"{name}: this object manager creates none with the bare provider, so that checks of "
-                                 "created records are left out")
+                self.report.note(f"{name}: this object manager cannot create records with the bare provider; checks of "
+                                 "created records are omitted")
 
 
 def steady(instance):
-    """Returns the values that do not change by themselves; none without an instance."""
+    """Returns the values except those that change with the time; none without an instance."""
     values = instance.values if instance else {}
     return {name: value for name, value in values.items() if name != "LocalDateTime"}

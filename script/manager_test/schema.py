@@ -1,4 +1,4 @@
-"""Reads the classes from their MOF."""
+"""Reads the classes from the MOF files."""
 
 import dataclasses
 import re
@@ -18,7 +18,7 @@ class Property:
     reference_class: str = ""
 
     def permits(self, value):
-        """Whether a value is one of the property's type."""
+        """Returns whether a value has the property's type."""
         if self.type.startswith("uint"):
             return value.isdigit() and int(value) < 2 ** int(self.type[4:])
         if self.type == "reference":
@@ -50,7 +50,7 @@ def read_properties(body):
 
 
 def read_classes(directory):
-    """The classes of the MOF files of a directory by name; where there are none, nothing."""
+    """Returns the classes of a directory's MOF files by name; empty if there are none."""
     classes = {}
     for file in sorted(directory.glob("VELKO_*.mof")):
         text = STRING.sub('""', file.read_text("utf-8"))

@@ -1,11 +1,11 @@
-"""Sends requests with wbemcli, and reads the XML of the responses, which wbemcli shows with -dx."""
+"""Sends requests with wbemcli, and parses the XML responses that wbemcli -dx prints."""
 
 import dataclasses
 import re
 import subprocess
 import xml.etree.ElementTree as xml
 
-# wbemcli puts the values of its arguments into its request as they are, and ends them at a comma or a quotation mark.
+# wbemcli copies argument values into its XML request without escaping, and ends them at a comma or quotation mark.
 ESCAPES = {ord(character): f"&#{ord(character)};" for character in '&<>",\\'}
 RESPONSE = re.compile(r"^From server: (<\?xml.*?</CIM>)", re.S | re.M)
 ERROR = re.compile(r"^\* wbemcli: (?:Cim: \((\d+)\) )?(.*)", re.M)
@@ -13,18 +13,18 @@ OBJECTS = ("INSTANCENAME", "OBJECTPATH", "VALUE.NAMEDINSTANCE", "VALUE.OBJECTWIT
 
 
 class Interrupted(Exception):
-    """A signal has ended the test."""
+    """Raised before the next request after a signal."""
 
 
 def assigned(values):
-    """Returns names and values as wbemcli takes them."""
+    """Returns names and values in the form of wbemcli's arguments."""
     return ",".join(f"{name}={value}" if isinstance(value, Path) else f'{name}="{value.translate(ESCAPES)}"'
                     for name, value in values.items())
 
 
 @dataclasses.dataclass(frozen=True)
 class Path:
-    """Names an instance. The keys are pairs of name and value, sorted; the value of a reference is a path."""
+    """An object path. The keys are sorted pairs of name and value; the value of a reference is a path."""
     class_name: str
     keys: tuple
 
@@ -48,7 +48,7 @@ class Path:
 
 @dataclasses.dataclass(frozen=True)
 class Instance:
-    """Values, without nulls, and types by the names of the properties. The path is None where the response has none."""
+    """An instance's values, without nulls, and types by property name. The path is None if the response has none."""
     path: Path
     class_name: str
     values: dict
@@ -82,7 +82,7 @@ def read_object(element):
 
 @dataclasses.dataclass
 class Response:
-    """The code is 0, a CIM status, or -1 for another error; printed is the number of objects that wbemcli shows."""
+    """The code is 0, a CIM status, or -1 for another error; printed is the number of objects that wbemcli prints."""
     request: str
     code: int = 0
     message: str = ""
