@@ -1,4 +1,4 @@
-# The CMPI headers: those of the system where it has a CMPI development package, ours otherwise.
+# Selects the CMPI headers: those of an installed CMPI development package, otherwise the project's own.
 set(LAW_CMPI_HEADERS AUTO CACHE STRING "Which CMPI headers to use: AUTO, SYSTEM or BUNDLED")
 set_property(CACHE LAW_CMPI_HEADERS PROPERTY STRINGS AUTO SYSTEM BUNDLED)
 

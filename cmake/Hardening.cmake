@@ -1,6 +1,6 @@
-# What makes a mistake with memory harder to exploit, in the process of whoever loads the libraries: stack protectors,
-# checked variants of the C library's functions, tables that are read-only once the library is loaded, positions that
-# nobody can foresee. script/check-hardening looks whether the built files have it.
+# Options that make memory errors harder to exploit: stack protectors, fortified functions of the C library,
+# relocations that are read-only after loading, and position-independent programs. script/check-hardening checks the
+# built files.
 include(CheckCompilerFlag)
 include(CheckPIESupported)
 
@@ -15,7 +15,7 @@ foreach(flag IN ITEMS -fstack-clash-protection -fcf-protection)
 endforeach()
 add_link_options(-Wl,-z,relro,-z,now,-z,noexecstack)
 
-# The checked variants need an optimised build, and the sanitizers check more.
+# Fortified functions need an optimised build, and the sanitizers check more.
 if(NOT LAW_SANITIZE)
     add_compile_options("$<$<NOT:$<CONFIG:Debug>>:SHELL:-U_FORTIFY_SOURCE -D_FORTIFY_SOURCE=2>")
 endif()

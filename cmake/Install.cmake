@@ -1,17 +1,17 @@
-# Where things are installed, and in which component: provider, agent, host or development.
+# Installation directories and components. The components are provider, agent, host and development.
 include(GNUInstallDirs)
 
 set(LAW_PROVIDER_DIRECTORY ${CMAKE_INSTALL_LIBDIR}/cmpi)
 set(LAW_HEADER_DIRECTORY ${CMAKE_INSTALL_INCLUDEDIR}/ostrel)
-# The package that CMake finds.
+# Name of the CMake package.
 set(LAW_EXPORT Ostrel)
-# The number of the binary interface that framework/ declares: libraries of other agents bear it too.
+# Version of the binary interface that framework/ declares. Libraries of other agents use it as their SOVERSION, too.
 set(LAW_FRAMEWORK_INTERFACE 1)
 
 find_program(LAW_GZIP gzip REQUIRED)
 mark_as_advanced(LAW_GZIP)
 
-# Libraries that the dynamic linker looks for elsewhere are found by their place seen from their users.
+# Libraries outside of the dynamic linker's default directories are found relative to the libraries that need them.
 set(from_provider_directory "$ORIGIN")
 set(from_library_directory "")
 if(NOT CMAKE_INSTALL_FULL_LIBDIR IN_LIST CMAKE_CXX_IMPLICIT_LINK_DIRECTORIES)
@@ -20,7 +20,7 @@ if(NOT CMAKE_INSTALL_FULL_LIBDIR IN_LIST CMAKE_CXX_IMPLICIT_LINK_DIRECTORIES)
 endif()
 
 # law_install_provider(<target> COMPONENT <component> [BESIDE_OTHERS])
-# A library that object managers load; with BESIDE_OTHERS, one that needs another of that directory.
+# Installs a library that object managers load. BESIDE_OTHERS: it needs another library in that directory.
 function(law_install_provider target)
     cmake_parse_arguments(arg "BESIDE_OTHERS" "COMPONENT" "" ${ARGN})
     set(search ${from_provider_directory})
@@ -32,7 +32,7 @@ function(law_install_provider target)
 endfunction()
 
 # law_install_library(<target> COMPONENT <component>)
-# A library with the interface that framework/ declares.
+# Installs a library that implements framework/.
 function(law_install_library target)
     cmake_parse_arguments(arg "" "COMPONENT" "" ${ARGN})
     set_target_properties(${target} PROPERTIES
@@ -44,7 +44,8 @@ function(law_install_library target)
 endfunction()
 
 # law_install_compressed(<file> <name> <directory> <component>)
-# Manual pages and changes are read compressed. The compressed file bears no time, so that it is always the same.
+# Installs a manual page or changelog compressed. The compressed file contains no timestamp, so that it is
+# reproducible.
 function(law_install_compressed file name directory component)
     set(compressed ${CMAKE_CURRENT_BINARY_DIR}/compressed/${component}/${name})
     set_property(DIRECTORY APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS ${file})

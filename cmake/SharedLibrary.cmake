@@ -1,10 +1,10 @@
-# A GNU_UNIQUE symbol pins its library in the process for good: a provider must be able to go.
+# A library with a GNU_UNIQUE symbol cannot be unloaded, and object managers unload providers.
 include(CheckCXXCompilerFlag)
 check_cxx_compiler_flag(-fno-gnu-unique LAW_HAVE_NO_GNU_UNIQUE)
 
 # law_shared_library(<target> [EXPORTS <version script>])
-# Options of a library that an object manager loads: no symbol left open, nothing exported by
-# accident (with EXPORTS: exactly what the version script names), and nothing that prevents unloading.
+# Sets the options of a library that an object manager loads: it has no undefined symbols, exports only the symbols of
+# the version script, and can be unloaded.
 function(law_shared_library target)
     cmake_parse_arguments(arg "" "EXPORTS" "" ${ARGN})
     target_link_libraries(${target} PRIVATE law_options)
