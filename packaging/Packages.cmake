@@ -1,4 +1,4 @@
-# The Debian packages, one a component. Included last: it packs what everything else installs.
+# The Debian packages, one per component. Include this file last: it packs what all other files install.
 set(CPACK_GENERATOR DEB)
 set(CPACK_SET_DESTDIR ON)
 set(CPACK_INSTALL_PREFIX ${CMAKE_INSTALL_PREFIX})
@@ -7,7 +7,7 @@ set(CPACK_VERBATIM_VARIABLES ON)
 set(CPACK_PACKAGE_VERSION ${PROJECT_VERSION})
 set(CPACK_PACKAGE_DIRECTORY ${PROJECT_BINARY_DIR}/packages)
 set(CPACK_PACKAGE_CONTACT "Lease and Warranty Provider developers <developers@lease-warranty-provider.example>")
-# Each package has a summary of its own.
+# Each package has a separate summary.
 set(CPACK_PACKAGE_DESCRIPTION_SUMMARY "")
 set(CPACK_COMPONENTS_ALL provider agent host development)
 set(CPACK_DEB_COMPONENT_INSTALL ON)
@@ -15,14 +15,14 @@ set(CPACK_DEBIAN_PACKAGE_RELEASE 1)
 set(CPACK_DEBIAN_FILE_NAME DEB-DEFAULT)
 set(CPACK_DEBIAN_PACKAGE_SECTION admin)
 set(CPACK_DEBIAN_PACKAGE_CONTROL_STRICT_PERMISSION ON)
-# What the libraries of other packages ask for is found out; those of the agent are not installed where this is run.
+# Computes the dependencies on libraries of other packages. The agent's libraries are not installed at this point.
 set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS ON)
 set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS_PRIVATE_DIRS ${CMAKE_LIBRARY_OUTPUT_DIRECTORY})
 
 set(debian ${CMAKE_CURRENT_LIST_DIR}/debian)
 
 # law_control_files(<component> <variable>)
-# The files of debian/<component> that control its package. What ends in .in is configured.
+# Lists the control files of a component's package, debian/<component>/*, and configures those that end in .in.
 function(law_control_files component variable)
     file(GLOB files CONFIGURE_DEPENDS ${debian}/${component}/*)
     list(REMOVE_ITEM files ${debian}/${component}/lintian-overrides)
@@ -39,9 +39,8 @@ endfunction()
 
 # law_package(<component> <name> DESCRIPTION <summary and lines> [DEPENDS <packages>] [SECTION <section>]
 #             [DOCUMENTS <names>])
-# Name, description and documents (in docs/) of a component's package. Its
-# control files are in debian/<component>; every package has copyright and changes, and says why it is not as lintian
-# wants it.
+# Defines the package of a component. DOCUMENTS are files of docs/, and debian/<component> has the control files. Each
+# package contains the copyright, the changelogs and its lintian overrides.
 macro(law_package component name)
     cmake_parse_arguments(arg "" "DESCRIPTION;DEPENDS;SECTION" "DOCUMENTS" ${ARGN})
     string(TOUPPER ${component} key)
@@ -63,13 +62,13 @@ macro(law_package component name)
     law_install_overrides(${component} ${name})
 endmacro()
 
-# Documents that are in another package than that of the provider.
+# Documents that are not in the provider's package.
 set(package_of_agent.md ostrel-reference-agent)
 set(package_of_cimhost.md cimhost)
 file(GLOB linked CONFIGURE_DEPENDS RELATIVE ${PROJECT_SOURCE_DIR}/docs ${PROJECT_SOURCE_DIR}/docs/*.md)
 
 # law_install_document(<name> <package> <component>)
-# Adapts the links of a document to the places of the packages. CONTRIBUTING.md is in none of them.
+# Adapts a document's links to the directories of the packages. No package contains CONTRIBUTING.md.
 function(law_install_document name package component)
     set(directory ${CMAKE_INSTALL_DATADIR}/doc/${package})
     set(document ${PROJECT_SOURCE_DIR}/docs/${name})
@@ -97,7 +96,7 @@ function(law_install_document name package component)
 endfunction()
 
 # law_install_overrides(<component> <name>)
-# Those of the component, after those that all packages have.
+# Installs the lintian overrides of all packages, followed by those of the component.
 function(law_install_overrides component name)
     set(overrides ${CMAKE_CURRENT_BINARY_DIR}/overrides/${name})
     configure_file(${debian}/lintian-overrides.in ${overrides} @ONLY)
@@ -117,28 +116,28 @@ A library that a CIM object manager (SFCB, OpenPegasus) loads, and that
 serves the leases and warranties under which a computer is held, the
 computer's asset identification and the identity of its management agent.
 
-With it comes a gate that lets one request at a time through and answers as
-the CIM standard has it, and the command lease-warranty-register, which
-registers the classes with the object manager.")
-# What its acceptance test of object managers runs with.
+The package also contains a gate, which serializes requests and follows the
+CIM standard, and the command lease-warranty-register, which registers the
+classes with the object manager.")
+# Needed by manager-test.
 set(CPACK_DEBIAN_PROVIDER_PACKAGE_SUGGESTS "cimhost, python3, sblim-wbemcli")
 
 law_package(agent ostrel-reference-agent
     DOCUMENTS agent.md
     DESCRIPTION "framework and logging library of a management agent
-The libraries that the CMPI provider for leases and warranties stands on, and
+The libraries that the CMPI provider for leases and warranties needs, and
 a CMPI provider of the computer that they belong to. They read the real
 machine: host name, vendor and model.
 
-Another agent's libraries with the same declarations can take their place.")
+Another agent's libraries with the same declarations can replace them.")
 set(CPACK_DEBIAN_AGENT_PACKAGE_PROVIDES ostrel-agent)
 
 law_package(host cimhost
     DOCUMENTS cimhost.md
     DESCRIPTION "runs CMPI providers without an object manager
 A small object manager for the command line: it loads a CMPI provider, sends
-it one request, shows the answer for people or as JSON or MOF, and ends. It
-knows classes from MOF files and providers from registrations in SFCB's form.")
+it one request, prints the response as text, JSON or MOF, and exits. It
+reads classes from MOF files and providers from registrations in SFCB's format.")
 set(CPACK_DEBIAN_HOST_PACKAGE_SUGGESTS lease-warranty-provider)
 
 set(version "${PROJECT_VERSION}-${CPACK_DEBIAN_PACKAGE_RELEASE}")
@@ -147,6 +146,6 @@ law_package(development lease-warranty-provider-dev
     DEPENDS "ostrel-reference-agent (= ${version}), cimhost (= ${version})"
     DESCRIPTION "headers to build CMPI providers with
 The CMPI 2.0 headers, the declarations of the agent's framework and logging
-library, and what CMake and pkg-config need to find them.")
+library, and the files with which CMake and pkg-config find them.")
 
 include(CPack)

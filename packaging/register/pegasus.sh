@@ -1,27 +1,27 @@
-# How OpenPegasus is found and told, which its server has to run for.
+# Registers with OpenPegasus, whose server must run.
 # shellcheck shell=sh disable=SC2034,SC2154 # the variables are those of the program that sources this file
 
 find_pegasus() {
     has cimprovider || has cimmof || has cimserver
 }
 
-# OpenPegasus takes registrations back through its server only, and keeps old ones where new ones are given. Its
-# cimmofl, which writes into the repository of a stopped server, is not used: what is registered cannot be seen then, so
-# an old registration would stay, and a server that does not answer may yet run, and write there too.
+# OpenPegasus removes registrations only through its server, and keeps an old registration if a new one is loaded.
+# cimmofl, which writes to the repository of a stopped server, is not used: without the server the registrations
+# cannot be read, so an old one would stay, and a server that does not respond may still be writing to the repository.
 pegasus_server() {
     for tool in cimmof cimprovider; do
         has "$tool" || {
-            failed "OpenPegasus is installed without its command $tool, which is needed"
+            failed "OpenPegasus is installed without the required command $tool"
             return 1
         }
     done
     pegasus_modules >/dev/null || {
-        failed "OpenPegasus: its server does not answer, and is needed: start cimserver"
+        failed "OpenPegasus: the server does not respond; start cimserver"
         return 1
     }
 }
 
-# Those of ours that are registered.
+# Prints the registered modules that belong to this package.
 pegasus_modules() {
     modules=$(limited cimprovider -l 2>/dev/null) || return 1
     for module in $(modules_in "$data"/pegasus/*.mof); do
@@ -31,7 +31,7 @@ pegasus_modules() {
     done
 }
 
-# Module and provider of what is registered of ours. Where that cannot be known it fails: there may be something.
+# Prints module and provider of this package's registrations. Fails if they cannot be read.
 pegasus_registered() {
     found=$(pegasus_modules) || return 1
     for module in $found; do
@@ -41,19 +41,19 @@ pegasus_registered() {
 }
 
 pegasus_unknown() {
-    failed "OpenPegasus: its server does not tell what is registered"
+    failed "OpenPegasus: the server does not list its registrations"
 }
 
-# Its builds keep registrations in namespaces of different names. That is looked for by asking: cimmof would make a
-# namespace that is not there.
+# Finds the namespace of the registrations, which differs between builds. Queries it, because cimmof would create a
+# missing namespace.
 pegasus_find_interop() {
-    places=${interop:-root/PG_InterOp root/interop interop}
-    for interop in $places; do
+    candidates=${interop:-root/PG_InterOp root/interop interop}
+    for interop in $candidates; do
         if ! has cimcli || pegasus_has_class "$interop" PG_ProviderModule; then
             return 0
         fi
     done
-    failed "OpenPegasus: no namespace of $places has the class PG_ProviderModule: name the one for --interop"
+    failed "OpenPegasus: none of the namespaces $candidates has the class PG_ProviderModule; name the right one with --interop"
     return 1
 }
 
@@ -61,7 +61,8 @@ pegasus_has_class() { # NAMESPACE CLASS
     limited cimcli gc -n "$1" "$2" >/dev/null 2>&1
 }
 
-# Computers may be served by another agent's provider: their class is not ours then. What cannot be known is left alone.
+# Sets `others` to whether another agent's provider serves computers; yes if that is unknown. Their class is not
+# changed then.
 pegasus_find_other_computers() {
     others=yes
     if has_computers || pegasus_modules | grep -qx "$(modules_in "$data/pegasus/$computers.mof")"; then
@@ -72,7 +73,7 @@ pegasus_find_other_computers() {
     fi
 }
 
-# The classes that anybody's provider is registered for.
+# Prints the classes for which any provider is registered.
 pegasus_served() {
     pegasus_find_interop >/dev/null 2>&1 || return 1
     capabilities=$(limited cimcli ei -n "$interop" PG_ProviderCapabilities 2>/dev/null) || return 1
@@ -86,36 +87,36 @@ pegasus_load_classes() {
         others=yes
         pegasus_declare_computers
     fi
-    # One call a file: of several, cimmof tells only how the last one went.
+    # One call per file: for several files, cimmof returns only the status of the last.
     for class in $(our_classes); do
         run cimmof -uc -n "$namespace" "$data/$class.mof" || return 1
     done
 }
 
-# Associations refer to computers. A class that another agent may have declared is declared where there is none, and not
-# changed.
+# Associations refer to computers. Declares their class if it is missing, without changing one that another agent may
+# have declared.
 pegasus_declare_computers() {
     for class in $(classes_of "$computers"); do
         if has cimcli && pegasus_has_class "$namespace" "$class"; then
             continue
         fi
         run cimmof -n "$namespace" "$data/$class.mof" ||
-            complain "OpenPegasus: going on: $class may be declared already"
+            complain "OpenPegasus: continuing, since $class may be declared already"
     done
 }
 
 pegasus_remove_modules() {
     former_modules=$(pegasus_modules) || return 1
     for module in $former_modules; do
-        [ "$module" = "$stays" ] || pegasus_remove_module "$module" || return 1
+        [ "$module" = "$kept_module" ] || pegasus_remove_module "$module" || return 1
     done
 }
 
-# OpenPegasus does not remove a module that answers requests.
+# OpenPegasus does not remove a module that is serving requests.
 pegasus_remove_module() { # MODULE
     run cimprovider -r -m "$1" && return
-    case $told in
-    *"rovider is busy"*) complain "OpenPegasus: clients use $1: stop them, and begin again" ;;
+    case $output in
+    *"rovider is busy"*) complain "OpenPegasus: clients use $1; stop them and try again" ;;
     esac
     return 1
 }
@@ -124,12 +125,12 @@ pegasus_load_provider() { # LIBRARY
     run cimmof -n "$interop" "$data/pegasus/$1.mof"
 }
 
-# A provider's place is taken when the former one is gone. It comes back where that or the new one fails.
-pegasus_replace() { # FORMER: module and provider, a line each
+# Removes the former registration, then loads the new one. If either fails, restores the former one.
+pegasus_replace() { # FORMER: module and provider per line
     pegasus_load_classes || return 1
     pegasus_remove_modules && pegasus_load_provider "$library" &&
         { ! has_computers || pegasus_load_provider "$computers"; } && return
-    [ -z "$1" ] || pegasus_put_back "$1"
+    [ -z "$1" ] || pegasus_restore "$1"
     return 1
 }
 
@@ -137,8 +138,8 @@ pegasus_new_name() { # PROVIDER
     if [ "$1" = "$former_computers" ]; then echo "$computers"; else echo "$1"; fi
 }
 
-# What cannot be removed is not registered over.
-pegasus_put_back() { # FORMER
+# Loads the former registrations again, except those that could not be removed.
+pegasus_restore() { # FORMER
     pegasus_remove_modules
     left=$(pegasus_modules) || return
     printf '%s\n' "$1" | while read -r module name; do
@@ -161,12 +162,12 @@ pegasus_look_for_library() {
     esac
 }
 
-# The module of computers by their former name, where the agent has them by that.
+# Prints the module of computers under their former name if the agent still has that provider.
 pegasus_former_computers() { # FORMER
     ! has_former_computers || printf '%s\n' "$1" | sed -n "s/ $former_computers\$//p"
 }
 
-# A signal is not heeded before the new registration has taken the old one's place.
+# Ignores signals until the new registration has replaced the old one.
 register_pegasus() {
     pegasus_server && pegasus_find_interop || return
     before=$(pegasus_registered) || {
@@ -174,17 +175,17 @@ register_pegasus() {
         return
     }
     choose_library "$before" || {
-        say "OpenPegasus: nothing was registered, and nothing is renewed"
+        say "OpenPegasus: not registered before; nothing was changed"
         return
     }
-    stays=$(pegasus_former_computers "$before")
+    kept_module=$(pegasus_former_computers "$before")
     on_signal ''
     if pegasus_replace "$before"; then
         registered_with=$registered_with,pegasus
-        done_saying "OpenPegasus: registered $library; it takes effect at once"
+        report_change "OpenPegasus: registered $library; it takes effect at once"
         pegasus_look_for_library
     else
-        failed "OpenPegasus: not registered as it should be; now it has:"
+        failed "OpenPegasus: not registered completely; registered now:"
         list_pegasus >&2
     fi
     on_signal -
@@ -192,7 +193,7 @@ register_pegasus() {
 
 pegasus_delete_classes() {
     has cimcli || {
-        say "OpenPegasus: the class definitions stay, since cimcli is not installed to delete them"
+        say "OpenPegasus: the class definitions are kept, since deleting them needs cimcli"
         return 0
     }
     for class in $(our_classes | tac); do
@@ -204,13 +205,13 @@ pegasus_delete_classes() {
 
 unregister_pegasus() {
     pegasus_server || return
-    stays=''
+    kept_module=''
     on_signal ''
     pegasus_find_other_computers
     if pegasus_remove_modules && pegasus_delete_classes; then
-        done_saying "OpenPegasus: unregistered"
+        report_change "OpenPegasus: unregistered"
     else
-        failed "OpenPegasus: not unregistered; now it has:"
+        failed "OpenPegasus: not unregistered completely; registered now:"
         list_pegasus >&2
     fi
     on_signal -

@@ -1,4 +1,4 @@
-# How SFCB is found and told. Its commands work on files: the server may be stopped.
+# Registers with SFCB. Its commands change files, so the server may be stopped.
 # shellcheck shell=sh disable=SC2034,SC2154 # the variables are those of the program that sources this file
 
 find_sfcb() {
@@ -8,21 +8,21 @@ find_sfcb() {
 sfcb_tools() {
     for tool in sfcbstage sfcbunstage sfcbrepos; do
         has "$tool" || {
-            failed "SFCB is installed without its command $tool, which is needed"
+            failed "SFCB is installed without the required command $tool"
             return 1
         }
     done
-    sfcb_look_for_place
+    sfcb_find_directory
 }
 
-# Sets where stage and registration are. Without an option, the command itself knows best.
-sfcb_look_for_place() {
-    sfcb_place=$sfcb_directory
-    if [ -z "$sfcb_place" ] && has sfcbrepos; then
-        sfcb_place=$(limited sfcbrepos -h 2>&1 | sed -n 's|.*\[\(/.*\)/registration\].*|\1|p')
+# Sets the directory of stage and registration; without an option, to the default of SFCB's own command.
+sfcb_find_directory() {
+    sfcb_base=$sfcb_directory
+    if [ -z "$sfcb_base" ] && has sfcbrepos; then
+        sfcb_base=$(limited sfcbrepos -h 2>&1 | sed -n 's|.*\[\(/.*\)/registration\].*|\1|p')
     fi
-    sfcb_place=${sfcb_place:-/var/lib/sfcb}
-    sfcb_stanza_file=$sfcb_place/registration/providerRegister
+    sfcb_base=${sfcb_base:-/var/lib/sfcb}
+    sfcb_stanza_file=$sfcb_base/registration/providerRegister
 }
 
 sfcb_stage() {
@@ -33,12 +33,12 @@ sfcb_unstage() {
     run sfcbunstage ${sfcb_directory:+-s "$sfcb_directory/stage"} "$@"
 }
 
-# Makes the repository again from the staged files.
+# Rebuilds the repository from the staged files.
 sfcb_rebuild() {
     run sfcbrepos -f ${sfcb_directory:+-s "$sfcb_directory/stage" -r "$sfcb_directory/registration"}
 }
 
-# Names in the stage of those that are not to stay there.
+# Prints the staged registration files to remove.
 sfcb_registrations() {
     for file in "$data"/*.reg "$data"/*/*.reg; do
         [ "$others ${file##*/}" = "yes $computers.reg" ] || echo "${file##*/}"
@@ -48,9 +48,10 @@ sfcb_registrations() {
     fi
 }
 
-# That of our computers by their former name, if it is staged. Somebody else's may bear that name too.
+# Prints the staged registration of computers under their former name. Other software may have a registration with
+# that name.
 sfcb_former_registration() {
-    file=$sfcb_place/stage/regs/$former_computers.reg
+    file=$sfcb_base/stage/regs/$former_computers.reg
     if grep -qs '^ *group: LeaseAndWarranty$' "$file"; then
         echo "${file##*/}"
     fi
@@ -60,17 +61,17 @@ sfcb_unstage_all() {
     for each in $(sfcb_registrations); do
         sfcb_unstage -r "$each" || return 1
     done
-    # shellcheck disable=SC2046 # one word a class: names of classes have no blanks
+    # shellcheck disable=SC2046 # one word per class: names of classes have no blanks
     sfcb_unstage $(our_classes | sed 's/$/.mof/') || return 1
     sfcb_is_unstaged
 }
 
-# The command ends with success even where it could not delete.
+# Checks the stage, because the command succeeds even if it cannot delete a file.
 sfcb_is_unstaged() {
     [ "$dry_run" = no ] || return 0
     for each in $(sfcb_registrations | sed 's|^|regs/|') $(our_classes | sed "s|.*|mofs/$namespace/&.mof|"); do
-        [ ! -e "$sfcb_place/stage/$each" ] || {
-            complain "$sfcb_place/stage/$each could not be deleted"
+        [ ! -e "$sfcb_base/stage/$each" ] || {
+            complain "$sfcb_base/stage/$each could not be deleted"
             return 1
         }
     done
@@ -78,39 +79,40 @@ sfcb_is_unstaged() {
 
 sfcb_register_all() {
     sfcb_unstage_all || return 1
-    # shellcheck disable=SC2046 # one word a file: installation directories have no blanks
+    # shellcheck disable=SC2046 # one word per file: installation directories have no blanks
     sfcb_stage -r "$(registration_of "$library")" $(our_classes | sed "s|.*|$data/&.mof|") || return 1
     if has_computers; then
         sfcb_stage -r "$(registration_of "$computers")"
     fi
 }
 
-# Copies lie beside the originals, so that putting them back is renaming, which takes no space; unless an original is a
-# link to another file system. SFCB's commands run in the directory of the copies, which has no MOF files: the compiler
-# looks for the files that the CIM schema includes, such as qualifiers.mof, in the current directory first.
+# Copies stage and registration. The copies are in the same file system as the originals, unless those are links, so
+# that renaming restores them and needs no space. SFCB's commands run in the directory of the copies, which has no MOF
+# files: the compiler looks for the files that the CIM schema includes, such as qualifiers.mof, in the current
+# directory first.
 sfcb_save() {
     [ "$dry_run" = no ] || return 0
-    if ! sfcb_copies=$(mktemp -d "$sfcb_place/before-$program.XXXXXX") || ! cd "$sfcb_copies"; then
-        complain "SFCB: $sfcb_place cannot be written to; is there another --sfcb-directory?"
+    if ! sfcb_copies=$(mktemp -d "$sfcb_base/before-$program.XXXXXX") || ! cd "$sfcb_copies"; then
+        complain "SFCB: $sfcb_base is not writable; if SFCB uses another directory, name it with --sfcb-directory"
         return 1
     fi
-    on_signal 'sfcb_leave "it was to end"; exit 1'
+    on_signal 'sfcb_abandon "the command was interrupted"; exit 1'
     for each in stage registration; do
-        [ ! -e "$sfcb_place/$each" ] || cp -aH "$sfcb_place/$each" "$sfcb_copies/" || {
-            sfcb_leave "no copy could be made of $sfcb_place/$each"
+        [ ! -e "$sfcb_base/$each" ] || cp -aH "$sfcb_base/$each" "$sfcb_copies/" || {
+            sfcb_abandon "$sfcb_base/$each could not be copied"
             return 1
         }
     done
-    on_signal 'sfcb_put_back; exit 1'
+    on_signal 'sfcb_restore; exit 1'
 }
 
-# The originals are as they were, and the copies may not be whole.
-sfcb_leave() { # REASON
+# Deletes the copies, which may be incomplete. The originals are unchanged.
+sfcb_abandon() { # REASON
     sfcb_discard
-    complain "SFCB: nothing is changed, since $1"
+    complain "SFCB: nothing was changed: $1"
 }
 
-# A signal finds the copies whole, or is ignored.
+# Deletes the copies. Ignores signals, so that none finds them incomplete.
 sfcb_discard() {
     [ "$dry_run" = no ] || return 0
     on_signal ''
@@ -119,63 +121,65 @@ sfcb_discard() {
     on_signal -
 }
 
-# Another run of sfcbrepos would not do: after a first that broke off, it deletes the last good repository.
-sfcb_put_back() {
+# Restores the copies. Running sfcbrepos again would not help: after a failed run, it deletes the last good
+# repository.
+sfcb_restore() {
     on_signal ''
-    if sfcb_put_back_one stage && sfcb_put_back_one registration; then
-        complain "SFCB: what was there before has been put back"
+    if sfcb_restore_one stage && sfcb_restore_one registration; then
+        complain "SFCB: the previous registration was restored"
         sfcb_discard
     else
-        complain "SFCB: what was there could not be put back: it is in $sfcb_copies"
+        complain "SFCB: the previous registration could not be restored; it is in $sfcb_copies"
         on_signal -
     fi
 }
 
-# Where the original is a link, it stays one.
-sfcb_put_back_one() { # DIRECTORY
-    original=$(readlink -f "$sfcb_place/$1") || return 1
+# Restores a directory; a link stays a link.
+sfcb_restore_one() { # DIRECTORY
+    original=$(readlink -f "$sfcb_base/$1") || return 1
     if [ -e "$original" ]; then
         mv "$original" "$sfcb_copies/failed-$1" || return 1
     fi
     [ ! -e "$sfcb_copies/$1" ] || mv "$sfcb_copies/$1" "$original"
 }
 
-# Does a step with what is staged, and makes the repository of it.
+# Runs a step that changes the stage, and rebuilds the repository.
 sfcb_change() { # STEP
     sfcb_save || return 1
     if "$1" && sfcb_rebuild; then
         sfcb_discard
         return 0
     fi
-    [ "$dry_run" = yes ] || sfcb_put_back
+    [ "$dry_run" = yes ] || sfcb_restore
     return 1
 }
 
-# SFCB reads its repository when it starts, and may be stopped meanwhile.
+# Restarts SFCB on request. SFCB reads its repository only when it starts, and may be stopped.
 sfcb_restart() {
     for unit in sblim-sfcb sfcb sfcbd; do
         if has systemctl && systemctl --quiet is-active "$unit" 2>/dev/null; then
             if [ "$restart" = yes ]; then
-                run systemctl restart "$unit" || failed "SFCB: restart it by hand: until then it serves what it did"
+                run systemctl restart "$unit" || failed "SFCB could not be restarted; it uses the old registration until you restart it"
             else
-                done_saying "SFCB is running: it takes effect when it is restarted (systemctl restart $unit)"
+                report_change "SFCB is running; the change takes effect when it is restarted (systemctl restart $unit)"
             fi
             return
         fi
     done
-    done_saying "SFCB: if its server is running, it takes effect when it is restarted"
+    report_change "SFCB: if its server is running, the change takes effect when it is restarted"
 }
 
-# Prints a value of SFCB's configuration, in which the last line counts. Fails if the configuration cannot be read.
+# Prints a value of SFCB's configuration; the last line with the name applies. Fails if the configuration cannot be
+# read.
 sfcb_setting() { # NAME
     [ -r "$sfcb_config" ] && sed -n "s/^[[:space:]]*$1:[[:space:]]*//p" "$sfcb_config" | tail -n 1
 }
 
-# A library is found by its name alone, in the directories that the configuration lists. Where it has no line for them,
-# SFCB looks in cmpi below the directory of its own libraries, among others.
-sfcb_look_for_library() {
+# Warns if SFCB may not find the library. It looks it up by its name in the directories that the configuration lists,
+# by default in cmpi below the directory of its own libraries, among others.
+sfcb_check_library() {
     directories=$(sfcb_setting providerDirs) || {
-        say "SFCB may not find the library: $sfcb_config cannot be read; its providerDirs has to name $libraries"
+        say "SFCB may not find the library: $sfcb_config cannot be read; its line providerDirs must contain $libraries"
         return
     }
     case " $directories " in
@@ -183,26 +187,27 @@ sfcb_look_for_library() {
     "  ")
         case $libraries in
         /usr/lib*/cmpi | /usr/local/lib*/cmpi) ;;
-        *) say "SFCB may not find the library: $sfcb_config has no line providerDirs, which could name $libraries" ;;
+        *) say "SFCB may not find the library: $sfcb_config has no line providerDirs with $libraries" ;;
         esac
         ;;
     *) say "SFCB will not find the library: add $libraries to the line providerDirs in $sfcb_config" ;;
     esac
 }
 
-# SFCB trims values by default, and takes the bytes of characters outside of ASCII for white space. Clients see success.
-sfcb_look_for_trimming() {
+# Warns if SFCB trims values, as it does by default. It treats the bytes of non-ASCII characters as white space, and
+# clients see success.
+sfcb_check_trimming() {
     sfcb_setting trimWhitespace | grep -qixE 'false([[:space:]].*)?' ||
         say "SFCB trims values, also non-ASCII characters at their ends, unless $sfcb_config has trimWhitespace: false"
 }
 
-# Prints class and provider of each stanza that comes in.
+# Prints class and provider of each stanza on the standard input.
 sfcb_stanzas() {
     awk '/^[ \t]*\[/ { class = $0; gsub(/[][ \t\r]/, "", class) }
          tolower($1) == "provider:" { print class, $2 }'
 }
 
-# Class and provider of what is registered of ours.
+# Prints class and provider of this package's registrations.
 sfcb_registered() {
     [ -r "$sfcb_stanza_file" ] || return 0
     sfcb_stanzas <"$sfcb_stanza_file" | while read -r class name; do
@@ -210,7 +215,7 @@ sfcb_registered() {
     done
 }
 
-# Computers may be served by another agent's provider: what it has staged of them is not ours then.
+# Sets `others` to whether another agent's provider serves computers. Its staged files are not changed then.
 sfcb_find_other_computers() {
     others=no
     has_computers && return
@@ -221,30 +226,30 @@ sfcb_find_other_computers() {
     done
 }
 
-# Class and provider of what anybody has staged, but ourselves under a former name.
+# Prints class and provider of all staged registrations except this package's former one.
 sfcb_staged_stanzas() {
     former_registration=$(sfcb_former_registration)
-    for file in "$sfcb_place"/stage/regs/*.reg; do
+    for file in "$sfcb_base"/stage/regs/*.reg; do
         [ "${file##*/}" = "$former_registration" ] || cat "$file" 2>/dev/null
     done | sfcb_stanzas
 }
 
 sfcb_registered_classes() {
-    sfcb_look_for_place
+    sfcb_find_directory
     [ -r "$sfcb_stanza_file" ] && sfcb_registered | sed 's/ .*//'
 }
 
 register_sfcb() {
     sfcb_tools || return
     choose_library "$(sfcb_registered)" || {
-        say "SFCB: nothing was registered, and nothing is renewed"
+        say "SFCB: not registered before; nothing was changed"
         return
     }
     sfcb_find_other_computers
     if sfcb_change sfcb_register_all; then
         registered_with=$registered_with,sfcb
-        done_saying "SFCB: registered $library"
-        sfcb_look_for_library
+        report_change "SFCB: registered $library"
+        sfcb_check_library
         sfcb_restart
     else
         failed "SFCB: not registered"
@@ -255,7 +260,7 @@ unregister_sfcb() {
     sfcb_tools || return
     sfcb_find_other_computers
     if sfcb_change sfcb_unstage_all; then
-        done_saying "SFCB: unregistered"
+        report_change "SFCB: unregistered"
         sfcb_restart
     else
         failed "SFCB: not unregistered"
@@ -263,9 +268,9 @@ unregister_sfcb() {
 }
 
 list_sfcb() {
-    sfcb_look_for_place
+    sfcb_find_directory
     if [ ! -r "$sfcb_stanza_file" ]; then
-        failed "SFCB: $sfcb_stanza_file cannot be read; is there another --sfcb-directory?"
+        failed "SFCB: $sfcb_stanza_file cannot be read; if SFCB uses another directory, name it with --sfcb-directory"
         return
     fi
     lines=$(sfcb_registered | sed 's/^/SFCB: /; s/ \([^ ]*\)$/ by \1/')

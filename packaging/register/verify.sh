@@ -1,10 +1,11 @@
-# How the classes are asked for through the object manager.
+# Checks through the object manager that the classes are served.
 # shellcheck shell=sh disable=SC2154 # the variables are those of the program that sources this file
 
-# These have an instance wherever they are served. Object managers answer an empty success where nobody serves a class.
+# Classes that always have an instance if they are served. For a class without provider, object managers return an
+# empty success.
 never_empty="VELKO_OstrelAgent VELKO_AssetIDDetails VELKO_ComputerSystem"
 
-# Sets the parts of the URL that clients take as options: scheme, server (host and port), user, password.
+# Splits the URL into the options of clients: scheme, server (host and port), user, password.
 split_url() {
     scheme=${url%%://*} server=${url#*://} user='' password=''
     case $server in
@@ -17,7 +18,7 @@ split_url() {
     esac
 }
 
-# Prints the paths of a class's instances as one of the clients does.
+# Prints the instance paths of a class with the installed client.
 ask() {
     "ask_$client" "$1" 2>&1
 }
@@ -35,7 +36,7 @@ ask_pywbemcli() {
     limited pywbemcli --server "$scheme://$server" "$@"
 }
 
-# This client takes any certificate, and finds a server of this machine best when it is told nothing.
+# This client accepts any certificate, and its default is the best way to reach a server on this machine.
 ask_cimcli() {
     set -- -n "$namespace" "$1"
     [ -z "$user" ] || set -- -u "$user" -p "$password" "$@"
@@ -44,7 +45,7 @@ ask_cimcli() {
     limited cimcli ni "$@"
 }
 
-# wbemcli says what went wrong in lines of its own.
+# wbemcli reports errors in lines with this prefix.
 is_error() {
     printf '%s\n' "$1" | grep -q '^\* wbemcli: '
 }
@@ -56,8 +57,8 @@ is_local() {
     esac
 }
 
-# Prints the classes that are registered here, if that can be known. Where both managers are installed, it is not known
-# which of them answers: it can be said of what is registered with both alike.
+# Prints the classes that are registered on this machine; fails if they are unknown. If both object managers are
+# installed, it is unknown which one responds, so the classes are known only if both have the same.
 registered_classes() {
     is_local || return 1
     with_sfcb='' with_pegasus=''
@@ -83,7 +84,7 @@ verify_class() { # CLASS
     answer=$(ask "$1")
     ended=$?
     if [ $ended -ne 0 ] || is_error "$answer"; then
-        case $ended in 124 | 137) answer="${answer:+$answer }$(what_ended $ended): $client" ;; esac
+        case $ended in 124 | 137) answer="${answer:+$answer }$(failure_of $ended): $client" ;; esac
         printf '%s\n' "$answer" | sed "s/^/$1: /" >&2
         failed "$1 is not served"
         return
@@ -92,13 +93,13 @@ verify_class() { # CLASS
     if [ "$count" -gt 0 ]; then
         echo "$1: served, $count instances"
     elif has_word "$never_empty" "$1"; then
-        failed "$1 is not served: the answer is empty, and would not be"
+        failed "$1 is not served: the response is empty, but this class always has an instance"
     elif [ "$registered_here" = unknown ]; then
-        echo "$1: no instances; served or not, the answer would be the same"
+        echo "$1: no instances; it is unknown whether the class is served"
     elif has_word "$registered_here" "$1"; then
         echo "$1: served, 0 instances"
     else
-        failed "$1 is not served: the answer is empty, and the class is not registered"
+        failed "$1 is not served: the response is empty, and the class is not registered"
     fi
 }
 
@@ -115,6 +116,6 @@ verify() {
     for class in $(all_classes); do
         verify_class "$class"
     done
-    [ "$sfcb" = no ] || ! is_local || sfcb_look_for_trimming
+    [ "$sfcb" = no ] || ! is_local || sfcb_check_trimming
     say "to test every operation of the classes, run $data/manager-test URL"
 }

@@ -1,7 +1,7 @@
-# Both object managers, none, and what is asked of neither. Sourced by register-test.
+# Both object managers, no object manager, and common options. Sourced by register-test.
 # shellcheck shell=bash disable=SC2034,SC2154 # the variables are those of machine.sh
 
-begin "Both object managers are told; one can be chosen"
+begin "Registers with both object managers, or with a chosen one"
 machine "${sfcb[@]}" "${pegasus[@]}"
 register register
 ends_with 0
@@ -14,13 +14,13 @@ register --manager pegasus unregister
 ends_with 0
 called_nothing_like '^sfcb'
 
-begin "One that fails does not keep the other from it"
+begin "A failing object manager does not prevent unregistering with the other"
 touch "$STAND_IN/stopped"
 register unregister
 ends_with 1
 says "SFCB: unregistered"
 
-begin "Computers by their former name stay registered while the agent has them by that, and are replaced afterwards"
+begin "Computers under their former name stay registered until the agent is upgraded, and are then replaced"
 machine "${sfcb[@]}" "${pegasus[@]}"
 former_computers() {
     register register
@@ -34,7 +34,7 @@ former_computers() {
 former_computers
 register --only-registered register
 ends_with 0
-says "the agent is older than this"
+says "the agent is an older version"
 provider_register 1 ComputerSystemProvider
 provider_register 6 LeaseAndWarrantyGate
 module OstrelComputerSystem ComputerSystemProvider
@@ -47,7 +47,7 @@ module LeaseAndWarranty LeaseAndWarrantyGate
 mv "$work/prefix/lib/libComputerSystemProvider.so" "$work/prefix/lib/libOstrelComputerSystemProvider.so"
 register --only-registered register
 ends_with 0
-says_nothing_of "older"
+says_nothing_of "older version"
 provider_register 0 ComputerSystemProvider
 provider_register 1 OstrelComputerSystemProvider
 module OstrelComputerSystem OstrelComputerSystemProvider
@@ -57,7 +57,7 @@ ends_with 0
 provider_register 0 ComputerSystemProvider
 [ -z "$(ls "$STAND_IN/modules")" ] || complain "a module is still registered"
 
-begin "Without an object manager there is nothing to do"
+begin "Fails with status 3 without an object manager"
 machine
 register register
 ends_with 3
@@ -66,7 +66,7 @@ machine "${sfcb[@]}"
 register --manager pegasus register
 ends_with 3
 
-begin "The caller's directory does not matter: one with MOF files, a deleted one or an unreadable one"
+begin "Works in any directory: with MOF files, deleted or unreadable"
 for directory in "with MOF files" deleted unreadable; do
     machine "${sfcb[@]}" "${pegasus[@]}" wbemcli
     mkdir "$work/directory"
@@ -83,7 +83,7 @@ for directory in "with MOF files" deleted unreadable; do
     cd "$here" || exit
 done
 
-begin "Files that options name are found from the caller's directory"
+begin "Relative paths in options are relative to the caller's directory"
 machine "${sfcb[@]}"
 sfcb_installation "$work/elsewhere/sfcb"
 echo "providerDirs: $work/prefix/lib" >"$work/elsewhere/sfcb.cfg"
@@ -113,14 +113,14 @@ done
 register --dry-run register
 says "would run: cimmof -n root/PG_InterOp"
 
-begin "Two runs do not change things at a time"
+begin "Two runs cannot change registrations concurrently"
 machine "${sfcb[@]}"
 exec 3>"$LEASE_WARRANTY_LOCK"
 flock 3
 register --time-limit 0.1 register
 ends_with 1
 says "waiting for another run to end"
-says "nothing is done"
+says "nothing was changed"
 called_nothing_like .
 register list
 ends_with 0
@@ -137,7 +137,7 @@ ln -sf /nowhere/lock "$LEASE_WARRANTY_LOCK"
 register register
 ends_with 0
 
-begin "Who listens no more does not end the work, neither here nor in the commands that say something"
+begin "Closing the output does not interrupt the work, neither of the program nor of the object managers' commands"
 for streams in output both; do
     machine "${sfcb[@]}" "${pegasus[@]}"
     register register --provider bare
@@ -150,7 +150,7 @@ for streams in output both; do
         # shellcheck disable=SC2086 # several words
         command_itself $command >&3 2>&4 || status=$?
         exec 3>&- 4>&-
-        [ $streams = output ] || echo "is heard by nobody" >"$work/output"
+        [ $streams = output ] || echo "no output" >"$work/output"
         ends_with 0
         says_nothing_of "error"
         [ "$command" != "register --dry-run" ] || continue
@@ -166,7 +166,7 @@ for streams in output both; do
     done
 done
 
-begin "What the commands say is passed on: what failed, on the error output"
+begin "Prints the output of the commands, that of a failed command on the error output"
 machine "${sfcb[@]}"
 touch "$STAND_IN/talkative"
 command_itself register >"$work/output" 2>"$work/errors" || complain "fails"
@@ -178,7 +178,7 @@ cp "$work/errors" "$work/output"
 says "Failed compiling the MOF files."
 says_nothing_of "sfcbstage: going on"
 
-begin "Wrong usage is told, and nothing is done"
+begin "Refuses wrong usage without a change"
 for arguments in "" "frobnicate" "register list" "--provider best register" "--provider" "--manager owner list" \
     "--time-limit soon list" "--time-limit 0 list" "--time-limit 0.0 list"; do
     # shellcheck disable=SC2086 # several words

@@ -1,7 +1,7 @@
 # OpenPegasus. Sourced by register-test.
 # shellcheck shell=bash disable=SC2034,SC2154 # the variables are those of machine.sh
 
-begin "OpenPegasus: registers classes, then providers"
+begin "OpenPegasus: registers classes before providers"
 machine "${pegasus[@]}"
 register register
 ends_with 0
@@ -13,13 +13,13 @@ called_nothing_like '^cimprovider -r'
 module LeaseAndWarranty LeaseAndWarrantyGate
 module OstrelComputerSystem OstrelComputerSystemProvider
 
-begin "OpenPegasus: what was registered is removed first, or it would stay"
+begin "OpenPegasus: removes an old registration before loading a new one"
 register --provider bare register
 ends_with 0
 in_order '^cimprovider -r -m LeaseAndWarranty$' '^cimmof -n root/PG_InterOp .*/pegasus/LeaseAndWarrantyProvider.mof'
 module LeaseAndWarranty LeaseAndWarrantyProvider
 
-begin "OpenPegasus: the computers that an earlier version has registered under another name are replaced"
+begin "OpenPegasus: replaces a registration of computers under their former name"
 for result in 0 1; do
     machine "${pegasus[@]}"
     register register
@@ -33,12 +33,12 @@ machine "${pegasus[@]}"
 register register
 register --provider bare register
 
-begin "OpenPegasus: lists what is registered"
+begin "OpenPegasus: lists the registrations"
 register list
 ends_with 0
 says "OpenPegasus: module LeaseAndWarranty, provider LeaseAndWarrantyProvider"
 
-begin "OpenPegasus: unregistering removes modules and classes, those that refer to others first, and can be repeated"
+begin "OpenPegasus: unregistering removes modules, then classes in the order of their references, and can be repeated"
 register unregister
 ends_with 0
 in_order '^cimprovider -r -m LeaseAndWarranty$' '^cimcli dc -n root/cimv2 VELKO_LeaseSetting' \
@@ -49,14 +49,14 @@ called_nothing_like '^cimprovider -r|^cimcli dc'
 register list
 says "OpenPegasus: nothing is registered"
 
-begin "OpenPegasus: without cimcli the classes stay"
+begin "OpenPegasus: keeps the classes without cimcli"
 machine cimmof cimprovider
 register register
 register unregister
 ends_with 0
-says "the class definitions stay"
+says "the class definitions are kept"
 
-begin "OpenPegasus: needs its server, and says so"
+begin "OpenPegasus: reports that the server is stopped"
 machine "${pegasus[@]}"
 touch "$STAND_IN/stopped"
 for command in register unregister list; do
@@ -65,12 +65,12 @@ for command in register unregister list; do
     says "start cimserver"
 done
 
-begin "OpenPegasus: the standard qualifiers where they are asked for"
+begin "OpenPegasus: declares the standard qualifiers on request"
 machine "${pegasus[@]}"
 register --with-qualifiers register
 in_order '^cimmof -uc -n root/cimv2 [^ ]*/velko-qualifiers.mof$' '^cimmof -uc -n root/cimv2 [^ ]*/VELKO_ComputerSystem.mof$'
 
-begin "OpenPegasus: classes that are refused leave what is registered, whichever of them it is"
+begin "OpenPegasus: keeps the registration if any class is refused"
 classes=$(sed -n 's/^#pragma include ("\(.*\).mof")$/\1/p' "$root/$data/classes.mof")
 [ "$(wc -w <<<"$classes")" -gt 5 ] || complain "no classes were found"
 for class in $classes; do
@@ -85,7 +85,7 @@ for class in $classes; do
     called_nothing_like '^cimprovider -r'
 done
 
-begin "OpenPegasus: where a provider is refused, the former one comes back"
+begin "OpenPegasus: restores the former provider if the new one is refused"
 machine "${pegasus[@]}"
 register register
 touch "$STAND_IN/refused/LeaseAndWarrantyProvider"
@@ -96,7 +96,7 @@ says "module LeaseAndWarranty, provider LeaseAndWarrantyGate"
 says "module OstrelComputerSystem, provider OstrelComputerSystemProvider"
 module LeaseAndWarranty LeaseAndWarrantyGate
 
-begin "OpenPegasus: where a former one cannot be removed, those that could come back"
+begin "OpenPegasus: restores removed modules if another module cannot be removed"
 machine "${pegasus[@]}"
 register register
 mkdir "$STAND_IN/kept"
@@ -109,7 +109,7 @@ called_nothing_like '^cimmof .*PG_InterOp .*ComputerSystem'
 module LeaseAndWarranty LeaseAndWarrantyGate
 module OstrelComputerSystem OstrelComputerSystemProvider
 
-begin "OpenPegasus: computers that were registered alone come back too"
+begin "OpenPegasus: restores computers that were registered without the other classes"
 machine "${pegasus[@]}"
 register register
 rm "$STAND_IN/modules/LeaseAndWarranty"
@@ -118,16 +118,16 @@ register register
 ends_with 1
 module OstrelComputerSystem OstrelComputerSystemProvider
 
-begin "OpenPegasus: what is registered is told where only a part is"
+begin "OpenPegasus: lists the registrations after a partial failure"
 machine "${pegasus[@]}"
 touch "$STAND_IN/refused/OstrelComputerSystemProvider"
 register register
 ends_with 1
-says "not registered as it should be"
+says "not registered completely"
 says "module LeaseAndWarranty, provider LeaseAndWarrantyGate"
 says_nothing_of "module OstrelComputerSystem"
 
-begin "OpenPegasus: a module that answers requests is not removed, and the reason is said"
+begin "OpenPegasus: reports a module that cannot be removed because it serves requests"
 machine "${pegasus[@]}"
 register register --provider bare
 touch "$STAND_IN/busy"
@@ -135,7 +135,7 @@ for command in "register --provider gate" unregister; do
     # shellcheck disable=SC2086 # several words
     register $command
     ends_with 1
-    says "OpenPegasus: clients use LeaseAndWarranty: stop them, and begin again"
+    says "OpenPegasus: clients use LeaseAndWarranty; stop them and try again"
     module LeaseAndWarranty LeaseAndWarrantyProvider
 done
 rm "$STAND_IN/busy"
@@ -144,8 +144,8 @@ ends_with 0
 says_nothing_of "clients use"
 module LeaseAndWarranty LeaseAndWarrantyGate
 
-begin "OpenPegasus: a module that cannot be removed is not registered over"
-for calls in 4 5; do # to list them once more, to remove one
+begin "OpenPegasus: does not load a provider whose module could not be removed"
+for calls in 4 5; do # to list them again, to remove one
     machine "${pegasus[@]}"
     register register
     echo $calls >"$STAND_IN/fail/cimprovider"
@@ -155,11 +155,11 @@ for calls in 4 5; do # to list them once more, to remove one
     called_nothing_like '^cimmof .*PG_InterOp'
 done
 
-begin "OpenPegasus: without an option the provider that is registered stays, and renewing registers nothing new"
+begin "OpenPegasus: without an option keeps the registered provider, and renewing registers nothing new"
 machine "${pegasus[@]}"
 register --only-registered register
 ends_with 0
-says "nothing is renewed"
+says "not registered before"
 called_nothing_like '^cimmof|^cimprovider -r'
 register --provider bare register
 for option in --restart --only-registered; do
@@ -169,28 +169,28 @@ for option in --restart --only-registered; do
     module LeaseAndWarranty LeaseAndWarrantyProvider
 done
 
-begin "OpenPegasus: where it is not told what is registered, nothing is changed, and that is said"
+begin "OpenPegasus: changes nothing if the registrations cannot be listed, and reports that"
 machine "${pegasus[@]}"
 register register --provider bare
-for calls in 1 2 3; do # of those that list: the first ask for the modules, the others for the provider of each
+for calls in 1 2 3; do # listing calls: the first lists the modules, the others the provider of each
     for option in "" --only-registered; do
         echo $calls >"$STAND_IN/fail/cimprovider"
         # shellcheck disable=SC2086 # none or one word
         register register $option
         ends_with 1
-        says "OpenPegasus: its server does not tell what is registered"
+        says "OpenPegasus: the server does not list its registrations"
         called_nothing_like '^cimmof|^cimprovider -r'
         module LeaseAndWarranty LeaseAndWarrantyProvider
     done
     echo $calls >"$STAND_IN/fail/cimprovider"
     register list
     ends_with 1
-    says "OpenPegasus: its server does not tell what is registered"
+    says "OpenPegasus: the server does not list its registrations"
     says_nothing_of "nothing is registered"
 done
 rm "$STAND_IN/fail/cimprovider"
 
-begin "OpenPegasus: computers that another agent's provider serves are left to it"
+begin "OpenPegasus: does not change computers that another agent's provider serves"
 machine "${pegasus[@]}"
 rm "$work/prefix/lib/libOstrelComputerSystemProvider.so"
 mkdir -p "$STAND_IN/classes"
@@ -205,7 +205,7 @@ ends_with 0
 called_nothing_like '^cimcli dc .*ComputerSystem'
 called 'cimcli dc -n root/cimv2 VELKO_Lease'
 
-begin "OpenPegasus: nor is their class changed where it cannot be seen"
+begin "OpenPegasus: does not change an existing class of computers without cimcli"
 machine cimmof cimprovider
 rm "$work/prefix/lib/libOstrelComputerSystemProvider.so"
 mkdir -p "$STAND_IN/classes"
@@ -213,10 +213,10 @@ echo "of another agent" >"$STAND_IN/classes/VELKO_ComputerSystem"
 register register
 ends_with 0
 says "VELKO_ComputerSystem may be declared already"
-grep -q "another agent" "$STAND_IN/classes/VELKO_ComputerSystem" || complain "the class is not what it was"
+grep -q "another agent" "$STAND_IN/classes/VELKO_ComputerSystem" || complain "the class was changed"
 module LeaseAndWarranty LeaseAndWarrantyGate
 
-begin "OpenPegasus: computers that nobody serves are declared, since associations refer to them, and go again"
+begin "OpenPegasus: declares and deletes the class of computers, which associations refer to, even if no provider serves it"
 for client in cimcli none; do
     machine cimmof cimprovider $client
     rm "$work/prefix/lib/libOstrelComputerSystemProvider.so"
@@ -229,7 +229,7 @@ for client in cimcli none; do
     [ $client = none ] || [ -z "$(ls "$STAND_IN/classes")" ] || complain "$(ls "$STAND_IN/classes") stays"
 done
 
-begin "OpenPegasus: the computers of an agent that is gone are taken back"
+begin "OpenPegasus: unregisters the computers of a removed agent"
 machine "${pegasus[@]}"
 register register
 rm "$work/prefix/lib/libOstrelComputerSystemProvider.so"
@@ -240,7 +240,7 @@ register unregister
 ends_with 0
 [ -z "$(ls "$STAND_IN/classes")" ] || complain "$(ls "$STAND_IN/classes") stays"
 
-begin "OpenPegasus: the namespace of registrations is found, and none is made"
+begin "OpenPegasus: finds the namespace of registrations and creates none"
 for place in root/interop interop; do
     machine "${pegasus[@]}"
     echo $place >"$STAND_IN/interop"
@@ -248,10 +248,10 @@ for place in root/interop interop; do
     ends_with 0
     called "cimmof -n $place .*/pegasus/LeaseAndWarrantyGate.mof"
     module OstrelComputerSystem OstrelComputerSystemProvider
-    [ ! -e "$STAND_IN/namespaces" ] || complain "a namespace is made" "$STAND_IN/namespaces"
+    [ ! -e "$STAND_IN/namespaces" ] || complain "a namespace was created" "$STAND_IN/namespaces"
 done
 
-begin "OpenPegasus: another namespace of registrations is named"
+begin "OpenPegasus: uses the named namespace of registrations"
 echo root/elsewhere >"$STAND_IN/interop"
 for option in "" "--interop root/mistyped"; do
     # shellcheck disable=SC2086 # two words
@@ -269,7 +269,7 @@ register register --interop root/interop
 ends_with 0
 module LeaseAndWarranty LeaseAndWarrantyGate
 
-begin "OpenPegasus: a signal leaves nothing undone"
+begin "OpenPegasus: a signal does not interrupt the change"
 for signal in TERM INT HUP QUIT; do
     machine "${pegasus[@]}"
     register register --provider bare
@@ -285,13 +285,13 @@ for signal in TERM INT HUP QUIT; do
     [ -z "$(find "$STAND_IN/modules" "$STAND_IN/classes" -type f)" ] || complain "something is still registered"
 done
 
-begin "OpenPegasus: a command that does not end is ended"
+begin "OpenPegasus: terminates a command that hangs"
 machine "${pegasus[@]}" timeout
 touch "$STAND_IN/hang/cimprovider"
 for command in register unregister list; do
     register $command
     ends_with 1
-    says "its server does not answer"
+    says "the server does not respond"
 done
 rm "$STAND_IN/hang/cimprovider"
 register register --provider bare
@@ -302,7 +302,7 @@ called 'timeout -k 10 120 cimmof .*'
 says "did not end within 120 seconds: cimmof"
 module LeaseAndWarranty LeaseAndWarrantyProvider
 
-begin "OpenPegasus: a provider directory that does not name the library's is a warning"
+begin "OpenPegasus: warns if the provider directories do not contain the library's"
 machine "${pegasus[@]}"
 register register
 says "add $work/prefix/lib to providerDir, with absolute names"

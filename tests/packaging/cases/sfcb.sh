@@ -14,13 +14,13 @@ provider_register 6 LeaseAndWarrantyGate
 provider_register 1 OstrelComputerSystemProvider
 [ "$(find "$STAND_IN/sfcb/stage/mofs" -name 'VELKO_*.mof' | wc -l)" -eq 7 ] || complain "not every class is staged"
 
-begin "SFCB: the bare provider takes the gate's place"
+begin "SFCB: the bare provider replaces the gate"
 register --provider bare register
 ends_with 0
 provider_register 6 LeaseAndWarrantyProvider
 provider_register 0 LeaseAndWarrantyGate
 
-begin "SFCB: without an option, the provider that is registered stays"
+begin "SFCB: without an option keeps the registered provider"
 register register
 ends_with 0
 provider_register 6 LeaseAndWarrantyProvider
@@ -29,15 +29,15 @@ begin "SFCB: registering again changes nothing"
 cp "$STAND_IN/sfcb/registration/providerRegister" "$work/before"
 register register --provider bare
 ends_with 0
-cmp "$work/before" "$STAND_IN/sfcb/registration/providerRegister" || complain "the registration is another"
+cmp "$work/before" "$STAND_IN/sfcb/registration/providerRegister" || complain "the registration has changed"
 
-begin "SFCB: lists what is registered"
+begin "SFCB: lists the registrations"
 register list
 ends_with 0
 says "SFCB: VELKO_Lease by LeaseAndWarrantyProvider"
 says "SFCB: VELKO_ComputerSystem by OstrelComputerSystemProvider"
 
-begin "SFCB: unregistering leaves nothing, and can be repeated"
+begin "SFCB: unregistering removes everything, and can be repeated"
 register unregister
 ends_with 0
 says "SFCB: unregistered"
@@ -49,14 +49,14 @@ ends_with 0
 register list
 says "SFCB: nothing is registered"
 
-begin "SFCB: a directory of its own is passed on"
+begin "SFCB: passes another directory to the commands"
 sfcb_installation "$work/elsewhere"
 register --sfcb-directory "$work/elsewhere" register
 ends_with 0
 called "sfcbrepos -f -s $work/elsewhere/stage -r $work/elsewhere/registration"
 grep -q LeaseAndWarrantyGate "$work/elsewhere/registration/providerRegister" || complain "not registered there"
 
-begin "SFCB: what cannot be staged or compiled leaves all as it was, the instances of others and our own registration"
+begin "SFCB: restores all files if staging or compiling fails, including static instances and the old registration"
 for obstacle in staging compiling; do
     machine "${sfcb[@]}"
     printf '[Other]\n   provider: Other\n#\n' >"$STAND_IN/sfcb/stage/regs/Other.reg"
@@ -73,14 +73,14 @@ for obstacle in staging compiling; do
         register $command
         ends_with 1
         says "SFCB: not ${command%% *}ed"
-        says "what was there before has been put back"
+        says "the previous registration was restored"
         sfcb_is_as_in "$work/before"
         [ -z "$(find "$STAND_IN/sfcb" -name 'before-*')" ] || complain "copies are left"
     done
     provider_register 6 LeaseAndWarrantyProvider
 done
 
-begin "SFCB: directories that are links stay links when they are put back"
+begin "SFCB: directories that are links stay links when they are restored"
 machine "${sfcb[@]}"
 mkdir "$work/elsewhere"
 for directory in stage registration; do
@@ -92,14 +92,14 @@ echo "broken" >"$work/elsewhere/stage/mofs/Other.mof"
 cp -R "$work/elsewhere" "$work/before"
 register register
 ends_with 1
-says "what was there before has been put back"
+says "the previous registration was restored"
 diff -r "$work/before" "$work/elsewhere" >"$work/output" || complain "the directories are not as they were"
 for directory in stage registration; do
     [ "$(readlink "$STAND_IN/sfcb/$directory")" = "../../elsewhere/$directory" ] || complain "$directory is no link any more"
 done
 [ -z "$(find "$STAND_IN/sfcb" -name 'before-*')" ] || complain "copies are left"
 
-begin "SFCB: what cannot be put back is told, and where it is"
+begin "SFCB: reports the location of files that cannot be restored"
 machine "${sfcb[@]}" mv
 echo "broken" >"$STAND_IN/sfcb/stage/Other.mof"
 mkdir -p "$STAND_IN/sfcb/stage/mofs"
@@ -107,21 +107,21 @@ echo "broken" >"$STAND_IN/sfcb/stage/mofs/Other.mof"
 echo 1 >"$STAND_IN/fail/mv"
 register register
 ends_with 1
-says "could not be put back: it is in $STAND_IN/sfcb/before-"
-says_nothing_of "has been put back"
+says "could not be restored; it is in $STAND_IN/sfcb/before-"
+says_nothing_of "was restored"
 grep -q "static instance" "$STAND_IN"/sfcb/before-*/registration/repository/instances || complain "the copy is not there"
 
-begin "SFCB: without a copy nothing is begun"
+begin "SFCB: changes nothing if the copies cannot be made"
 machine "${sfcb[@]}" cp
 echo 0 >"$STAND_IN/fail/cp"
 sfcb_files >"$work/before"
 register register
 ends_with 1
-says "nothing is changed"
+says "nothing was changed"
 called_nothing_like '^sfcb'
 sfcb_is_as_in "$work/before"
 
-begin "SFCB: a signal leaves all as it was, whenever it comes before the end"
+begin "SFCB: a signal before the end restores all files"
 for command in cp sfcbunstage sfcbstage sfcbrepos "sfcbstage QUIT" "sfcbstage INT" "sfcbstage HUP"; do
     signal=${command#* }
     command=${command% *}
@@ -133,12 +133,12 @@ for command in cp sfcbunstage sfcbstage sfcbrepos "sfcbstage QUIT" "sfcbstage IN
     register register --provider gate
     ends_with 1
     called "$command .*"
-    if [ "$command" = cp ]; then says "nothing is changed"; else says "has been put back"; fi
+    if [ "$command" = cp ]; then says "nothing was changed"; else says "was restored"; fi
     sfcb_is_as_in "$work/before"
     [ -z "$(find "$STAND_IN/sfcb" -name 'before-*')" ] || complain "copies are left"
 done
 
-begin "SFCB: a signal keeps nobody from putting back, nor from ending when all is done"
+begin "SFCB: a signal does not interrupt restoring or deleting the copies"
 machine "${sfcb[@]}" mv
 register register --provider bare
 mkdir -p "$STAND_IN/sfcb/stage/mofs"
@@ -147,7 +147,7 @@ sfcb_files >"$work/before"
 echo TERM >"$STAND_IN/end/mv"
 register register --provider gate
 ends_with 1
-says "has been put back"
+says "was restored"
 sfcb_is_as_in "$work/before"
 machine "${sfcb[@]}" rm
 echo TERM >"$STAND_IN/end/rm"
@@ -156,7 +156,7 @@ ends_with 0
 provider_register 6 LeaseAndWarrantyGate
 [ -z "$(find "$STAND_IN/sfcb" -name 'before-*')" ] || complain "copies are left"
 
-begin "SFCB: a command that does not end is ended, and all is as it was"
+begin "SFCB: terminates a command that hangs, and restores all files"
 machine "${sfcb[@]}" timeout
 register register --provider bare
 sfcb_files >"$work/before"
@@ -165,28 +165,28 @@ register --time-limit 90 --provider gate register
 ends_with 1
 called 'timeout -k 10 90 sfcbrepos -f'
 says "did not end within 90 seconds: sfcbrepos -f"
-says "has been put back"
+says "was restored"
 sfcb_is_as_in "$work/before"
 
-begin "SFCB: a staged file that stays though its command answers success is told"
+begin "SFCB: reports a staged file that its command does not delete in spite of success"
 machine "${sfcb[@]}"
-mkdir -p "$STAND_IN/sfcb/stage/regs/LeaseAndWarrantyProvider.reg/in-the-way"
+mkdir -p "$STAND_IN/sfcb/stage/regs/LeaseAndWarrantyProvider.reg/entry"
 register register
 ends_with 1
 says "stage/regs/LeaseAndWarrantyProvider.reg could not be deleted"
 
-begin "SFCB: a command that is missing is named"
+begin "SFCB: names a missing command"
 machine sfcbrepos sfcbstage
 register register
 ends_with 1
-says "without its command sfcbunstage"
+says "without the required command sfcbunstage"
 called_nothing_like .
 
-begin "SFCB: renewing registers with nobody who was not registered with, and keeps the provider"
+begin "SFCB: renewing registers only if registered before, and keeps the provider"
 machine "${sfcb[@]}"
 register --only-registered register
 ends_with 0
-says "nothing is renewed"
+says "not registered before"
 called_nothing_like .
 register --provider bare register
 rm "$STAND_IN/sfcb/stage/mofs/root/cimv2/VELKO_Lease.mof"
@@ -195,7 +195,7 @@ ends_with 0
 provider_register 6 LeaseAndWarrantyProvider
 [ -e "$STAND_IN/sfcb/stage/mofs/root/cimv2/VELKO_Lease.mof" ] || complain "the classes are not renewed"
 
-begin "SFCB: a running server is restarted when that is asked for, and named otherwise"
+begin "SFCB: restarts a running server on request, and otherwise names its unit"
 machine "${sfcb[@]}" systemctl
 echo sblim-sfcb >"$STAND_IN/unit"
 register register
@@ -206,7 +206,7 @@ register register --restart
 ends_with 0
 called "systemctl restart sblim-sfcb"
 
-begin "SFCB: a configuration that does not name the library's directory is a warning"
+begin "SFCB: warns if the configuration does not contain the library's directory"
 echo "providerDirs: /usr/lib /elsewhere" >"$work/sfcb.cfg"
 register register
 ends_with 0
@@ -215,24 +215,24 @@ echo "providerDirs: /usr/lib $work/prefix/lib" >"$work/sfcb.cfg"
 register register
 says_nothing_of "providerDirs"
 
-begin "SFCB: a configuration that cannot be read is a warning"
+begin "SFCB: warns if the configuration cannot be read"
 rm "$work/sfcb.cfg"
 register register
 ends_with 0
-says "$work/sfcb.cfg cannot be read; its providerDirs has to name $work/prefix/lib"
+says "$work/sfcb.cfg cannot be read; its line providerDirs must contain $work/prefix/lib"
 
-begin "SFCB: a configuration that names no directories is a warning where SFCB would not look of itself"
+begin "SFCB: warns if the configuration names no directories and the library is outside of the default directories"
 echo "httpPort: 5988" >"$work/sfcb.cfg"
 register register
 ends_with 0
-says "which could name $work/prefix/lib"
-# shellcheck disable=SC2016 # it is the command that expands it
+says "has no line providerDirs with $work/prefix/lib"
+# shellcheck disable=SC2016 # the command expands it
 sed -i 's|^libraries=\$(readlink.*|libraries=/usr/lib/x86_64-linux-gnu/cmpi|' "$work/prefix/sbin/lease-warranty-register"
 register register
 ends_with 0
 says_nothing_of "providerDirs"
 
-begin "SFCB: computers that another agent's provider serves are left to it"
+begin "SFCB: does not change computers that another agent's provider serves"
 machine "${sfcb[@]}" wbemcli
 rm "$work/prefix/lib/libOstrelComputerSystemProvider.so"
 mkdir -p "$STAND_IN/sfcb/stage/mofs/root/cimv2"
@@ -253,10 +253,10 @@ says "VELKO_ComputerSystem is not served"
 register unregister
 ends_with 0
 called_nothing_like 'ComputerSystem'
-grep -q "another agent" "$STAND_IN/sfcb/stage/mofs/root/cimv2/VELKO_ComputerSystem.mof" || complain "its class is gone"
+grep -q "another agent" "$STAND_IN/sfcb/stage/mofs/root/cimv2/VELKO_ComputerSystem.mof" || complain "its class was deleted"
 provider_register 1 Other
 
-begin "SFCB: computers that nobody serves are declared, since associations refer to them"
+begin "SFCB: declares the class of computers, which associations refer to, even if no provider serves it"
 rm "$STAND_IN/sfcb/stage/regs/Other.reg"
 register register
 ends_with 0
@@ -264,7 +264,7 @@ grep -q "^class VELKO_ComputerSystem" "$STAND_IN/sfcb/stage/mofs/root/cimv2/VELK
     complain "the class is not staged"
 provider_register 0 OstrelComputerSystemProvider
 
-begin "SFCB: the computers of an agent that is gone are taken back"
+begin "SFCB: unregisters the computers of a removed agent"
 machine "${sfcb[@]}"
 register register
 provider_register 1 OstrelComputerSystemProvider
@@ -274,14 +274,14 @@ ends_with 0
 provider_register 0 OstrelComputerSystemProvider
 provider_register 6 LeaseAndWarrantyGate
 
-# As an earlier version has staged it; another's registration may have that name as well.
+# Stages the registration of an earlier version; other software may have a registration with that name.
 former_computers() { # GROUP
     mkdir -p "$STAND_IN/sfcb/stage/regs"
     sed "s/OstrelComputerSystemProvider/ComputerSystemProvider/; s/group: .*/group: $1/" \
         "$work/prefix/$data/OstrelComputerSystemProvider.reg" >"$STAND_IN/sfcb/stage/regs/ComputerSystemProvider.reg"
 }
 
-begin "SFCB: the computers that an earlier version has registered under another name are taken back"
+begin "SFCB: unregisters computers under their former name"
 for command in register unregister; do
     for library in libOstrelComputerSystemProvider.so none; do
         machine "${sfcb[@]}"
@@ -301,7 +301,7 @@ for command in register unregister; do
     done
 done
 
-begin "SFCB: somebody else's registration of that name stays"
+begin "SFCB: keeps a registration of other software with that name"
 machine "${sfcb[@]}"
 former_computers Other
 for command in register unregister; do

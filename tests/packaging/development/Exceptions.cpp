@@ -5,7 +5,7 @@
 #include <exception>
 #include <string>
 
-// Somebody else's program: it catches what the framework throws, and throws the framework's exceptions itself.
+// An external program that catches the framework's exceptions, and throws and catches them itself.
 
 namespace {
 

@@ -3,7 +3,7 @@
 
 #include <string>
 
-// Somebody else's provider: it names one thing, after the agent's product.
+// An external provider with one instance, which is named after the agent's product.
 
 namespace {
 
@@ -13,51 +13,51 @@ CMPIStatus unsupported() {
     return {CMPI_RC_ERR_NOT_SUPPORTED, nullptr};
 }
 
-CMPIStatus thingCleanup(CMPIInstanceMI*, const CMPIContext*, CMPIBoolean) {
+CMPIStatus productCleanup(CMPIInstanceMI*, const CMPIContext*, CMPIBoolean) {
     return {CMPI_RC_OK, nullptr};
 }
 
-CMPIStatus thingEnumInstanceNames(CMPIInstanceMI*, const CMPIContext*, const CMPIResult* result,
+CMPIStatus productEnumInstanceNames(CMPIInstanceMI*, const CMPIContext*, const CMPIResult* result,
                                   const CMPIObjectPath* path) {
     const std::wstring name = KO::Product::getName();
     const std::string narrow(name.begin(), name.end());
-    CMPIObjectPath* thing = CMNewObjectPath(broker, "root/cimv2", "Somebody_Thing", nullptr);
-    CMAddKey(thing, "Name", narrow.c_str(), CMPI_chars);
+    CMPIObjectPath* product = CMNewObjectPath(broker, "root/cimv2", "External_Product", nullptr);
+    CMAddKey(product, "Name", narrow.c_str(), CMPI_chars);
     static_cast<void>(path);
-    CMReturnObjectPath(result, thing);
+    CMReturnObjectPath(result, product);
     CMReturnDone(result);
     return {CMPI_RC_OK, nullptr};
 }
 
-CMPIStatus thingEnumInstances(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*,
+CMPIStatus productEnumInstances(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*,
                               const char**) {
     return unsupported();
 }
 
-CMPIStatus thingGetInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*,
+CMPIStatus productGetInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*,
                             const char**) {
     return unsupported();
 }
 
-CMPIStatus thingCreateInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*,
+CMPIStatus productCreateInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*,
                                const CMPIInstance*) {
     return unsupported();
 }
 
-CMPIStatus thingModifyInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*,
+CMPIStatus productModifyInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*,
                                const CMPIInstance*, const char**) {
     return unsupported();
 }
 
-CMPIStatus thingDeleteInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*) {
+CMPIStatus productDeleteInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*) {
     return unsupported();
 }
 
-CMPIStatus thingExecQuery(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*, const char*,
+CMPIStatus productExecQuery(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*, const char*,
                           const char*) {
     return unsupported();
 }
 
 }  // namespace
 
-CMInstanceMIStub(thing, SomebodysProvider, broker, CMNoHook)
+CMInstanceMIStub(product, ExternalProvider, broker, CMNoHook)
