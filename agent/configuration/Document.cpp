@@ -27,7 +27,7 @@ std::size_t lineAt(std::string_view text, std::size_t position) {
     return 1 + static_cast<std::size_t>(std::count(before.begin(), before.end(), '\n'));
 }
 
-/** The first line of the parser's message, without the name of the function that failed. */
+/** Returns the first line of the parser's message without the name of the function that failed. */
 std::string_view reasonOf(const toml::exception& failure) {
     std::string_view message = failure.what();
     message = message.substr(0, message.find('\n'));

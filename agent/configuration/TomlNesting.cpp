@@ -6,7 +6,7 @@ namespace Agent {
 
 namespace {
 
-/** Length of the string at the head of a document, with its quotation marks. */
+/** Returns the length of the string at the start of a document, with its quotation marks. */
 std::size_t stringLength(std::string_view document) {
     const char quote = document.front();
     const std::string_view longDelimiter = quote == '"' ? R"(""")" : "'''";
@@ -24,7 +24,7 @@ std::size_t stringLength(std::string_view document) {
     return std::min(length, document.size());
 }
 
-/** Length of the string, comment or single character at the head of a document. */
+/** Returns the length of the string, comment or single character at the start of a document. */
 std::size_t tokenLength(std::string_view document) {
     switch (document.front()) {
         case '"':

@@ -6,12 +6,12 @@
 
 namespace Agent {
 
-/** Brackets within brackets, and dots in a key, that the configuration may have. */
+/** Maximum depth of nested brackets, and maximum number of dots in a key. */
 constexpr int deepestNesting = 16;
 
 /**
- * Finds the first line of a TOML document in which brackets or the parts of a key are nested deeper than that. The
- * TOML parser recurses for each level, and would overflow the stack.
+ * Returns the first line of a TOML document in which brackets or the parts of a key are nested deeper. The TOML
+ * parser recurses for each level and would overflow the stack.
  */
 std::optional<std::size_t> lineNestedTooDeep(std::string_view document);
 

@@ -35,7 +35,7 @@ constexpr const char* placeholders[] = {
     "unknown",
 };
 
-/** The names of SMBIOS for chassis types, starting with 1; empty for those without meaning. */
+/** SMBIOS names of chassis types, starting with 1; empty for types without meaning. */
 constexpr const char* chassisWords[] = {
     "",  // Other
     "",  // Unknown
@@ -80,7 +80,10 @@ bool isPlaceholder(const std::string& text) {
                        [&text](const char* placeholder) { return cim::sameName(placeholder, text); });
 }
 
-/** Folds runs of blanks, control characters and bytes that are not UTF-8 into one blank; none at the ends. */
+/**
+ * Replaces runs of blanks, control characters and bytes that are not UTF-8 by one blank, and removes them at the
+ * ends.
+ */
 std::string tidy(std::string_view text) {
     std::string tidied;
     for (; !text.empty();) {
@@ -99,13 +102,13 @@ std::string tidy(std::string_view text) {
     return tidied;
 }
 
-/** The printable string; empty if it is a placeholder. */
+/** Returns the printable string; empty if it is a placeholder. */
 std::string meaningful(std::string_view text) {
     std::string tidied = tidy(text);
     return isPlaceholder(tidied) ? std::string() : tidied;
 }
 
-/** The value of a DMI file; empty if the file is absent, unreadable or a placeholder. */
+/** Returns the value of a DMI file; empty if the file is absent, unreadable or a placeholder. */
 std::string readDmi(const std::string& path, Agent::Problems& problems) {
     const Agent::FileContent file = Agent::readFile(path);
     if (file.error != 0 && !file.absent()) {
@@ -129,7 +132,7 @@ std::string chassisWord(const std::string& text) {
     return chassisWords[type - 1];
 }
 
-/** "model - suffix". Readers cut the name at its first dash, so the model must not have one. */
+/** Returns "model - suffix". Callers cut the name at its first dash, so the model must not contain one. */
 std::string productName(std::string model, const std::string& chassis) {
     std::replace(model.begin(), model.end(), '-', ' ');
     return orElse(meaningful(model), "Computer") + " - " + orElse(chassisWord(chassis), "Computer");

@@ -7,7 +7,7 @@
 
 namespace KO {
 
-/** This computer's host name; "localhost" if the system has none. */
+/** Returns this computer's host name; "localhost" if the system has none. */
 std::string hostName();
 
 /**

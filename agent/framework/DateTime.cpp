@@ -11,7 +11,7 @@ namespace {
 
 constexpr unsigned int localTime = 3;
 
-/** Minutes by which local time is ahead of UTC at a moment. */
+/** Returns the offset of local time from UTC in minutes at a moment. */
 int localOffset(std::time_t moment) {
     std::tm fields{};
     return ::localtime_r(&moment, &fields) != nullptr ? static_cast<int>(fields.tm_gmtoff / 60) : 0;

@@ -27,7 +27,7 @@ constexpr ClassEntry classIds[] = {
     {"VELKO_AssetIDDetails", ClassId::assetIDDetails},
 };
 
-/** By the convention of CMPI, a value of type CMPI_chars is the characters themselves. */
+/** Returns a value of type CMPI_chars, which is the pointer to the characters itself. */
 const CMPIValue* asValue(const char* characters) {
     return reinterpret_cast<const CMPIValue*>(characters);
 }

@@ -19,7 +19,7 @@ namespace {
     throwFileError("Cannot write ", path, errno);
 }
 
-/** A distinct name in the file's directory, by which a file that a crash leaves behind can be recognized. */
+/** Returns a distinct name in the file's directory, so that a file that a crash leaves can be recognized. */
 std::string temporaryNameFor(const std::string& target) {
     const std::size_t name = target.rfind('/') + 1;
     return target.substr(0, name) + "." + target.substr(name) + ".new-XXXXXX";
@@ -96,7 +96,10 @@ private:
     Agent::FileDescriptor file;
 };
 
-/** The file that a path resolves to; the path itself if there is none. Fails for a link that cannot be resolved. */
+/**
+ * Returns the file that a path resolves to; the path itself if there is none. Fails for a link that cannot be
+ * resolved.
+ */
 std::string followLinks(const std::string& path) {
     std::error_code error;
     const std::filesystem::path target = std::filesystem::canonical(path, error);

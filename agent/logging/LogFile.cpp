@@ -35,7 +35,7 @@ public:
     }
 
 private:
-    /** Does not wait for the reader of a pipe, follows no link, and creates no directory. */
+    /** Opens the file. Does not wait for the reader of a pipe, follows no link, and creates no directory. */
     void open() {
         constexpr int flags = O_WRONLY | O_APPEND | O_CREAT | O_NOFOLLOW | O_CLOEXEC | O_NONBLOCK | O_NOCTTY;
         constexpr mode_t modeOfNewFiles = 0640;  // records contain values of clients
@@ -73,7 +73,7 @@ private:
         open();
     }
 
-    /** The name of a rotated file, with its number before the extension; 0 is the log file itself. */
+    /** Returns the name of a rotated file, with its number before the extension; 0 is the log file itself. */
     std::string nameOf(std::size_t number) const {
         if (number == 0) {
             return path;

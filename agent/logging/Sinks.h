@@ -15,7 +15,7 @@ public:
     Sink& operator=(const Sink&) = delete;
     virtual ~Sink() = default;
 
-    /** Writes one record, which then survives the process. @throws std::exception on failure */
+    /** Writes one record. A later crash of the process does not lose it. @throws std::exception on failure */
     virtual void write(const Record& record) = 0;
 };
 

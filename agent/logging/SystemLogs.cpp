@@ -43,7 +43,7 @@ private:
 std::string cut(std::string text) {
     if (text.size() > longestText) {
         std::size_t end = longestText;
-        while (end > 0 && (static_cast<unsigned char>(text[end]) & 0xC0U) == 0x80U) {  // in a character of UTF-8
+        while (end > 0 && (static_cast<unsigned char>(text[end]) & 0xC0U) == 0x80U) {  // continuation byte of UTF-8
             --end;
         }
         text.resize(end);

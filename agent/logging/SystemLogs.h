@@ -23,7 +23,7 @@ std::unique_ptr<Sink> openJournal(const LogSettings& settings,
                                   const std::string& socketPath = "/run/systemd/journal/socket");
 ///@}
 
-/** The most bytes of a record that a datagram is sure to hold. */
+/** Maximum number of bytes of a record that fit into a datagram on every system. */
 constexpr std::size_t longestText = 100000;
 
 }  // namespace RZLog

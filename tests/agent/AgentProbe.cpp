@@ -21,7 +21,7 @@
 
 namespace {
 
-/** probe log LEVEL LOGGER TEXT: one record on each channel. */
+/** probe log LEVEL LOGGER TEXT: logs one record on each channel. */
 void log(int level, const std::string& logger, const std::string& text) {
     errno = ENOTTY;
     RZLog::RZLogger::logLevelMessage("getLessor", "Lease.cpp", 42, logger, level, nullptr, 0, 0, text);
@@ -32,7 +32,7 @@ void log(int level, const std::string& logger, const std::string& text) {
 }
 
 /** probe admits LEVEL LOGGER: prints whether the log admits such a record, before and after writing one. */
-void sayWhetherAdmitted(int level, const std::string& logger) {
+void printWhetherAdmitted(int level, const std::string& logger) {
     const auto say = [&] { std::cout << (RZLog::RZLogger::admits(logger, level) ? "yes" : "no") << std::endl; };
     say();
     log(level, logger, "some text");
@@ -87,7 +87,7 @@ void logToAFullDisk() {
     ::setrlimit(RLIMIT_FSIZE, &limit);
 }
 
-/** probe cancelled: a thread that has been cancelled logs, as the first thing that it does. */
+/** probe cancelled: logs from a thread that has been cancelled. */
 void logCancelled() {
     std::thread thread([] {
         ::pthread_cancel(::pthread_self());
@@ -98,7 +98,7 @@ void logCancelled() {
     thread.join();
 }
 
-/** Logs when the process's static objects go, those of the libraries included. */
+/** Logs when the process's static objects are destroyed, those of the libraries included. */
 struct LogAtExit {
     bool enabled = false;
     ~LogAtExit() {
@@ -116,7 +116,7 @@ int main(int count, char** arguments) {
     if (words.size() == 4 && words[0] == "log") {
         log(std::stoi(words[1]), words[2], words[3]);
     } else if (words.size() == 3 && words[0] == "admits") {
-        sayWhetherAdmitted(std::stoi(words[1]), words[2]);
+        printWhetherAdmitted(std::stoi(words[1]), words[2]);
     } else if (words.size() == 3 && words[0] == "many") {
         logMany(std::stoi(words[1]), std::stoi(words[2]));
     } else if (words.size() == 1 && words[0] == "show") {

@@ -20,7 +20,7 @@ void* operator new(std::size_t size) {
     throw std::bad_alloc();
 }
 
-// A sanitizer replaces this variant too, and the operators below could not release its memory.
+// Sanitizers replace this operator; the operators below could not free its memory.
 void* operator new(std::size_t size, const std::nothrow_t&) noexcept {
     ++allocations;
     return std::malloc(size);

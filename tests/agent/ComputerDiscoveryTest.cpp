@@ -19,7 +19,7 @@ constexpr unsigned int productProperty = 39;
 
 class ComputerDiscoveryTest : public testing::Test {
 protected:
-    /** The properties of the computer that is found with the DMI files written so far. */
+    /** Returns the properties of the computer that is discovered with the DMI files written so far. */
     std::map<unsigned int, std::string> computer() {
         const NodeTree tree = KO::discoverComputer(dmi.path(), "host1", problems);
         EXPECT_EQ(tree.nodes().size(), 2U);

@@ -15,7 +15,7 @@ namespace {
 
 class ConfigurationInProcess : public testing::Test {
 protected:
-    /** What the probe shows under a configuration that also has a log file. */
+    /** Returns the probe's output with a configuration that also has a log file. */
     std::string show(const std::string& settings) {
         const std::string logging = "[log]\ndestination = '" + directory.file("agent.log") + "'\ntrace_level = 0\n";
         const ProbeResult result = runProbe(directory.write("agent.toml", settings + logging), {"show"});

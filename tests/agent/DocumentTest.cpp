@@ -100,7 +100,7 @@ TEST(Document, AcceptsAnyCharacterAfterABackslashInLiteralStrings) {
     EXPECT_EQ(nameIn(document), "\\\xC3\xA4");
 }
 
-TEST(Document, RejectsWhatIsNotUtf8) {
+TEST(Document, RejectsInvalidUtf8) {
     EXPECT_EQ(Document::parse("name = 'x'\n'y\xFF'.z = 1", "agent.toml").problem(),
               "agent.toml is not valid TOML (line 2: a character is not UTF-8); using the defaults");
 }

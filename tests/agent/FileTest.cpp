@@ -18,7 +18,7 @@ using KO::make_wstring;
 
 namespace {
 
-/** The message of the exception that opening throws; empty if it throws none. */
+/** Returns the message of the exception that opening throws; empty if it throws none. */
 std::string failureOfOpening(const std::string& path, unsigned long mode) {
     try {
         File file(make_wstring(path));

@@ -36,7 +36,7 @@ std::string demangled(const char* name) {
     return text != nullptr ? text.get() : name;
 }
 
-/** What nm or readelf would list: the symbols that a library defines for others. */
+/** Returns the symbols that a library exports, like nm or readelf. */
 std::vector<Symbol> exportsOf(const std::string& library);
 
 class Content {

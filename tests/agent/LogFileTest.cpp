@@ -64,7 +64,7 @@ TEST_F(LogFileTest, NumbersRotatedFilesWithoutExtensionAtTheEnd) {
     EXPECT_THAT(files(), ElementsAre(".hidden", ".hidden.1", "agent", "agent.1"));
 }
 
-TEST_F(LogFileTest, CountsWhatTheFileHasWhenItIsOpened) {
+TEST_F(LogFileTest, CountsTheExistingContentWhenItIsOpened) {
     write(*open("agent.log"), large);
     write(*open("agent.log"), large);
     EXPECT_THAT(files(), ElementsAre("agent.1.log", "agent.log"));
@@ -79,7 +79,7 @@ TEST_F(LogFileTest, WritesARecordThatIsLargerThanTheRotationSizeIntoAnEmptyFile)
 TEST_F(LogFileTest, IsEmptiedWhenItIsFullAndCannotBeRenamed) {
     std::filesystem::create_directory(directory.file("agent.1.log"));
     std::filesystem::create_directory(directory.file("agent.2.log"));
-    directory.write("agent.2.log/file", "keeps the directory from being replaced");
+    directory.write("agent.2.log/file", "prevents that the directory is replaced");
     const auto sink = open("agent.log");
     write(*sink, large + "first");
     write(*sink, large + "second");

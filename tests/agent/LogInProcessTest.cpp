@@ -73,7 +73,7 @@ TEST_F(LogInProcess, HasLevelsForEachChannelAndLogger) {
     EXPECT_THAT(lines()[0], HasSubstr("\tlog\t6000\tOstrel.Test\t"));
 }
 
-TEST_F(LogInProcess, WritesNothingAnywhereByDefault) {
+TEST_F(LogInProcess, WritesNothingByDefault) {
     run("", {"log", "3000", "Ostrel.Test", "some text"});
     const ProbeResult unconfigured = runProbe(directory.file("none.toml"), {"log", "3000", "Ostrel.Test", "some text"});
     EXPECT_EQ(unconfigured.output + unconfigured.errors, "");
@@ -89,7 +89,7 @@ TEST_F(LogInProcess, ReportsWhetherALevelIsAdmitted) {
         toFile() + "trace_level = 4000\n[[log.logger]]\nname = 'Ostrel.Test'\nlog_level = 6000\n";
     EXPECT_EQ(admits(toFile(), "3000", "Ostrel.Test"), "yes\nyes\n");
     EXPECT_EQ(admits(toFile(), "3001", "Ostrel.Test"), "no\nno\n");
-    EXPECT_EQ(admits(louder, "4000", "Ostrel.Other"), "yes\nyes\n") << "the trace channel takes it";
+    EXPECT_EQ(admits(louder, "4000", "Ostrel.Other"), "yes\nyes\n") << "the trace channel admits it";
     EXPECT_EQ(admits(louder, "4001", "Ostrel.Other"), "no\nno\n");
     EXPECT_EQ(admits(louder, "6000", "Ostrel.Test"), "yes\nyes\n");
     EXPECT_EQ(admits(louder, "6001", "Ostrel.Test"), "no\nno\n");

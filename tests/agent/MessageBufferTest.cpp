@@ -12,7 +12,7 @@ using RZLog::RZMessageBuffer;
 
 namespace {
 
-/** The string that a new buffer makes of some values. */
+/** Returns the string that a new buffer formats from some values. */
 std::string sampleOfFreshBuffer() {
     RZMessageBuffer buffer;
     static_cast<std::ostream&>(buffer) << 1234567 << ' ' << 0.5 << ' ' << true << ' ' << std::setw(4) << 7;

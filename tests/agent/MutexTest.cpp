@@ -13,7 +13,7 @@ namespace {
 
 constexpr unsigned long withoutLimit = 0xFFFFFFFF;
 
-/** Whether another thread can lock the mutex without waiting. */
+/** Returns whether another thread can lock the mutex without waiting. */
 bool isFree(Mutex& mutex) {
     bool taken = false;
     std::thread([&mutex, &taken] {

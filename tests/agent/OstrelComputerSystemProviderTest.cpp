@@ -38,7 +38,7 @@ std::string nameIn(const ObjectPath& path) {
     return textIn(path.keys.at(0).value);
 }
 
-/** Requests to the provider, in a namespace of their own. */
+/** Requests to the provider in the test's namespace. */
 class OstrelComputerSystemProviderTest : public testing::Test {
 protected:
     CMPIObjectPath* path(std::vector<NamedValue> keys = {}, const std::string& className = "VELKO_ComputerSystem") {
@@ -148,7 +148,7 @@ TEST_F(OstrelComputerSystemProviderTest, RejectsOtherClasses) {
     EXPECT_THAT(events, IsEmpty());
 }
 
-TEST_F(OstrelComputerSystemProviderTest, IsReadOnlyAndAnswersNoQueries) {
+TEST_F(OstrelComputerSystemProviderTest, IsReadOnlyAndDoesNotSupportQueries) {
     const CMPIInstanceMIFT& functions = *mi->ft;
     CMPIObjectPath* object = path({{"Name", text("host1")}});
     CMPIInstance* instance = scope.instance({});
@@ -182,7 +182,7 @@ TEST_F(OstrelComputerSystemProviderTest, ReportsThatTheBrokerCannotCreateAnObjec
     EXPECT_THAT(events, IsEmpty());
 }
 
-TEST_F(OstrelComputerSystemProviderTest, AnswersConcurrentRequests) {
+TEST_F(OstrelComputerSystemProviderTest, ServesConcurrentRequests) {
     std::vector<std::thread> threads;
     std::vector<std::size_t> counts(4);
     for (std::size_t& count : counts) {

@@ -7,7 +7,7 @@
 
 namespace agent_test {
 
-/** A plain value of a CIM type, such as plain(CMPI_uint32, std::uint32_t{7}). */
+/** Returns a plain value of a CIM type, such as plain(CMPI_uint32, std::uint32_t{7}). */
 template <typename Element>
 cimhost::Value plain(CMPIType type, Element element) {
     return {type, false, false, {cimhost::Scalar(std::move(element))}};
@@ -25,7 +25,7 @@ inline cimhost::Value nullOf(CMPIType type) {
     return {type, false, true, {}};
 }
 
-/** The string of a string value; otherwise a string that no test expects. */
+/** Returns the string of a string value; otherwise a string that no test expects. */
 inline std::string textIn(const cimhost::Value& value) {
     const std::string* found = value.elements.empty() ? nullptr : std::get_if<std::string>(&value.elements.front());
     return found != nullptr ? *found : "(no text)";

@@ -14,7 +14,7 @@ namespace agent_test {
 
 namespace {
 
-/** This process's environment with one variable set or removed. */
+/** Returns this process's environment with one variable set or removed. */
 std::vector<std::string> environmentWith(const std::string& configuration) {
     std::vector<std::string> variables;
     for (char** variable = environ; *variable != nullptr; ++variable) {

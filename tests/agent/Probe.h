@@ -7,12 +7,12 @@ namespace agent_test {
 
 /** Exit code and output of a probe process. */
 struct ProbeResult {
-    int exitCode;  ///< -1 when it did not end by itself
+    int exitCode;  // /< -1 if the process was killed by a signal
     std::string output;
     std::string errors;
 };
 
-/** Runs the probe under a configuration file; an empty path leaves the variable unset. */
+/** Runs the probe with a configuration file; for an empty path, the variable is not set. */
 ProbeResult runProbe(const std::string& configuration, std::vector<std::string> arguments);
 
 /** Runs another program instead of the probe. */

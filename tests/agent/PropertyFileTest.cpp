@@ -19,7 +19,7 @@ class PropertyFileTest : public testing::Test {
 protected:
     static KO::File::Path path(const std::string& text) { return KO::File::Path(KO::make_wstring(text)); }
 
-    /** Inode of the file, which changes when it is replaced. */
+    /** Returns the inode of the file, which changes when the file is replaced. */
     ino_t identity() const {
         struct stat status {};
         EXPECT_EQ(::stat(directory.file("asset.dat").c_str(), &status), 0);

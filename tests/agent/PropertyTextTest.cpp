@@ -6,7 +6,7 @@ using KO::PropertyText;
 
 namespace {
 
-/** The value of a key after a property file with one entry has been written and read. */
+/** Writes and reads a property file with one entry. Returns the value of the key. */
 std::string roundTrip(const std::string& key, const std::string& value) {
     PropertyText written;
     written.set("before", "1");

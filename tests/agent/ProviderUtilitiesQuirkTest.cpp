@@ -9,8 +9,8 @@
 using KO::Moniker;
 using KO::ProviderUtilities;
 
-// Object managers pass odd values to providers. These tests construct them: a function table has only the functions
-// that a test needs, and the handle of a path or instance has the values that it returns.
+// Unusual values that object managers pass to providers. A function table has only the functions that a test needs,
+// and the handle of a path or instance contains the values that it returns.
 
 namespace {
 
@@ -105,7 +105,7 @@ CMPIData charsData(const char* characters) {
 
 class Quirks : public testing::Test {
 protected:
-    /** Whether a string is read, as a key and as a property; both must agree. */
+    /** Returns whether a string is read, as a key and as a property; both must agree. */
     bool readsText(const CMPIData& data, CMPIrc rc = CMPI_RC_OK) {
         path.answers.data = data;
         path.answers.rc = rc;
@@ -236,7 +236,7 @@ TEST_F(Quirks, ANullNameReadsAndWritesNothing) {
 
 namespace {
 
-/** Everything that takes a path, an instance or a broker; none may crash. */
+/** Calls all functions that take a path, an instance or a broker; none may crash. */
 void exerciseEverything(CMPIObjectPath* path, CMPIInstance* instance, const CMPIBroker* broker) {
     std::string value = "kept";
     unsigned int number = 99;

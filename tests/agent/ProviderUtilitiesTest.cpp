@@ -21,7 +21,7 @@ using testing::Pair;
 
 namespace {
 
-/** A request in which objects are made; what the utilities make is read back as plain values. */
+/** A request in which the utilities create objects. The tests read them as plain values. */
 class ProviderUtilitiesTest : public testing::Test {
 protected:
     CMPIObjectPath* path(const std::string& className, std::vector<NamedValue> keys = {}) {
@@ -42,7 +42,7 @@ protected:
         return std::get<Instance>(events.back());
     }
 
-    /** The one property of an instance after it was set. */
+    /** Returns the only property of an instance after it was set. */
     cimhost::Value onlyProperty(const CMPIInstance* object) {
         const Instance value = valueOf(object);
         EXPECT_EQ(value.properties.size(), 1U);
@@ -288,5 +288,5 @@ TEST_F(ProviderUtilitiesTest, ConvertAMonikerToKeysOfAPath) {
     EXPECT_EQ(textIn(value.keys[2].value), "host1");
     std::string name;
     EXPECT_TRUE(moniker.getName(name));
-    EXPECT_EQ(name, "Name") << "the selection stays";
+    EXPECT_EQ(name, "Name") << "the selection is unchanged";
 }

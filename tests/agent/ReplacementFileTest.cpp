@@ -42,15 +42,15 @@ TEST(ReplacementFile, ReplacesTheOldFileAndKeepsItsMode) {
     replaceFile(path, "new");
     EXPECT_EQ(directory.read("file"), "new");
     EXPECT_EQ(modeOf(path), 0604U);
-    EXPECT_EQ(entriesOf(directory), 1U) << "nothing is left behind";
+    EXPECT_EQ(entriesOf(directory), 1U) << "no other file remains";
 }
 
 TEST(ReplacementFile, KeepsTheOwner) {
     const TemporaryDirectory directory;
     const std::string path = directory.write("file", "old");
-    const bool mayGiveAway = ::geteuid() == 0;  // nobody else can have a file of another owner here
-    const uid_t owner = mayGiveAway ? 4711 : ::geteuid();
-    const gid_t group = mayGiveAway ? 4712 : ::getegid();
+    const bool canChangeOwner = ::geteuid() == 0;  // only root can create a file of another owner
+    const uid_t owner = canChangeOwner ? 4711 : ::geteuid();
+    const gid_t group = canChangeOwner ? 4712 : ::getegid();
     ASSERT_EQ(::chown(path.c_str(), owner, group), 0);
     ASSERT_EQ(::chmod(path.c_str(), 0660), 0);
     replaceFile(path, "new");
@@ -61,7 +61,7 @@ TEST(ReplacementFile, KeepsTheOwner) {
     EXPECT_EQ(modeOf(path), 0660U);
 }
 
-/** Attributes of the file after an unprivileged user with write access to its directory has replaced it. */
+/** Returns the attributes of a file after an unprivileged user with write access to its directory has replaced it. */
 struct stat statusAfterReplacement(const TemporaryDirectory& directory, const std::vector<gid_t>& groupsOfReplacer) {
     constexpr uid_t somebody = 65534;
     EXPECT_EQ(::chown(directory.path().c_str(), somebody, somebody), 0);
@@ -84,7 +84,7 @@ class ReplacementByAnother : public testing::TestWithParam<std::pair<mode_t, mod
 protected:
     void SetUp() override {
         if (::geteuid() != 0) {
-            GTEST_SKIP() << "only root can make somebody else's file";
+            GTEST_SKIP() << "only root can create a file of another owner";
         }
         const std::string path = directory.write("file", "old");
         ASSERT_EQ(::chown(path.c_str(), 4711, group), 0);
@@ -167,5 +167,5 @@ TEST(ReplacementFile, KeepsTheOldFileIfItFails) {
     directory.write("target/inside", "old");
     EXPECT_THROW(replaceFile(directory.file("target"), "new"), KO::FrameworkException);
     EXPECT_EQ(directory.read("target/inside"), "old");
-    EXPECT_EQ(entriesOf(directory), 1U) << "the temporary file is gone";
+    EXPECT_EQ(entriesOf(directory), 1U) << "the temporary file is removed";
 }

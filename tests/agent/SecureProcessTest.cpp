@@ -1,4 +1,4 @@
-// A process with more rights than its caller: it must ignore the caller's environment.
+// A process with more rights than its caller must ignore the caller's environment.
 
 #include "agent/Probe.h"
 
@@ -22,7 +22,7 @@ using testing::Not;
 
 namespace {
 
-/** A supplementary group of the process; its primary group if there is none. */
+/** Returns a supplementary group of the process; its primary group if there is none. */
 gid_t otherGroup() {
     if (::geteuid() == 0) {
         return ::getegid() + 1;
@@ -107,7 +107,7 @@ TEST(SecureProcess, IgnoresTheCallersPathsOfObjectManagerFiles) {
     }
 }
 
-/** cimhost is not among them: what reads its command line could read variables, had its options any. */
+/** cimhost is excluded: its command-line library could read variables, but none of its options uses one. */
 TEST(SecureProcess, ReadsVariablesOnlyWithSecureGetenv) {
     std::istringstream libraries(SHIPPED_LIBRARIES);
     for (std::string library; std::getline(libraries, library, ':');) {

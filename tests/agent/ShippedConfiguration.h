@@ -6,7 +6,7 @@
 #include <fstream>
 #include <string>
 
-/** The configuration file that is installed, with the keys that it shows commented out in use. */
+/** Returns the installed configuration file with its commented-out keys enabled. */
 inline std::string shippedConfiguration() {
     std::ifstream file(AGENT_CONFIGURATION);
     EXPECT_TRUE(file) << AGENT_CONFIGURATION;

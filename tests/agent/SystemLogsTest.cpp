@@ -35,7 +35,7 @@ public:
     Service(const Service&) = delete;
     Service& operator=(const Service&) = delete;
 
-    /** All messages in its queue. */
+    /** Returns all messages in its queue. */
     std::vector<std::string> readAll() const {
         std::vector<std::string> messages;
         std::string content(2 * RZLog::longestText, ' ');
@@ -78,7 +78,7 @@ protected:
         sink.write({RZLog::Channel::log, level, "Ostrel.Test", "getLessor", "Lease.cpp", 42, text});
     }
 
-    /** Writes more records than the service's queue holds. @return how many are lost */
+    /** Writes more records than fit into the service's queue. @return the number of lost records */
     std::size_t overfill(RZLog::Sink& sink) {
         constexpr std::size_t many = 5000;
         for (std::size_t number = 0; number < many; ++number) {
@@ -102,7 +102,7 @@ TEST_P(SystemLogs, DropRecordsWhileTheServiceIsBusyAndReportTheirCount) {
     EXPECT_THAT(service->readAll(),
                 ElementsAre(HasSubstr(": " + lost + " records were lost: "), HasSubstr("the next")));
     write(*sink, "the last");
-    EXPECT_THAT(service->readAll(), ElementsAre(HasSubstr("the last"))) << "it is said once";
+    EXPECT_THAT(service->readAll(), ElementsAre(HasSubstr("the last"))) << "it is reported once";
 }
 
 TEST_P(SystemLogs, DoNotReportTheCountIfTheOwnLoggerIsSilent) {
@@ -117,9 +117,9 @@ TEST_P(SystemLogs, FindARestartedService) {
     write(*sink, "one");
     EXPECT_THAT(service->readAll(), SizeIs(1));
     service.reset();
-    write(*sink, "to a socket that nobody has");
+    write(*sink, "no process has the socket open");
     ::unlink(path.c_str());
-    write(*sink, "to no socket");
+    write(*sink, "the socket does not exist");
     start();
     write(*sink, "two");
     EXPECT_THAT(service->readAll(), ElementsAre(HasSubstr(": 2 records were lost: "), HasSubstr("two")));
@@ -130,7 +130,7 @@ TEST_P(SystemLogs, DropRecordsWithoutAService) {
     ::unlink(path.c_str());
     const auto sink = open();
     EXPECT_NO_THROW(write(*sink, "one"));
-    EXPECT_FALSE(std::filesystem::exists(path)) << "nobody makes it";
+    EXPECT_FALSE(std::filesystem::exists(path)) << "no process creates it";
 }
 
 TEST_P(SystemLogs, TruncateLongRecordsBetweenCharacters) {
@@ -156,7 +156,7 @@ INSTANTIATE_TEST_SUITE_P(Both, SystemLogs,
 
 class SystemLogForm : public testing::Test {
 protected:
-    /** The message about a record of that level. */
+    /** Returns the message about a record of that level. */
     std::string message(const SystemLog& log, int level) {
         const Service service(directory.file(log.name));
         log.open({}, directory.file(log.name))

@@ -4,7 +4,7 @@
 
 namespace agent_test {
 
-/** The directory whose subdirectories "install" and "data" this program's agent is configured with. */
+/** Returns the directory with the subdirectories "install" and "data" of this program's agent. */
 const std::string& configuredDirectory();
 
 }  // namespace agent_test

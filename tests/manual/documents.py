@@ -1,4 +1,4 @@
-"""Reads the documents: the blocks of text in them that are shown as they are."""
+"""Reads the fenced blocks and the tables of the documents."""
 
 import re
 import textwrap
@@ -10,7 +10,7 @@ MARK = re.compile(r"<!-- tested: ([\w ]+) -->\s*\Z")
 
 
 class Block:
-    """A block between fences: its language, the mark in front of it that says who runs it, and its text."""
+    """A fenced block: its language, its text, and the preceding mark that names its test."""
 
     def __init__(self, document, match):
         self.place = f"{document.relative_to(ROOT)}:{document.read_text('utf-8')[:match.start()].count(chr(10)) + 1}"
@@ -35,7 +35,7 @@ def all_blocks(language=None, mark=None):
 
 
 def rows(document, heading=""):
-    """The rows of the tables below a heading, or of all tables: lists of cells without their code marks."""
+    """Returns the rows of the tables below a heading, or of all tables, as lists of cells without backquotes."""
     text = document.read_text("utf-8")
     if heading:
         text = re.split(rf"^#+ {re.escape(heading)}$", text, 1, re.M)[1]
@@ -45,7 +45,7 @@ def rows(document, heading=""):
 
 
 def without_tested_blocks(document):
-    """What is left of a document without the blocks that say who runs them, and those that are illustrations."""
+    """Returns a document without marked blocks and without illustrations."""
     text = document.read_text("utf-8")
     tested = lambda match: "" if Block(document, match).mark or match[2] == "console" else match[0]  # noqa: E731
     return FENCE.sub(tested, text)

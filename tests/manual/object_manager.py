@@ -1,7 +1,7 @@
 """A stand-in for an object manager: cimhost-lab performs each request, with the gate or without it, as SFCB would.
 
-Answers CIM-XML over HTTP, as far as the clients in the documents need it; and, in the module pywbem of stand-ins/, the
-calls that a Python client makes.
+Implements CIM-XML over HTTP as far as the documents' clients need it. The module pywbem of stand-ins/ implements the
+calls of the documents' Python client with it.
 """
 
 import contextlib
@@ -53,11 +53,11 @@ class Manager:
         return json.loads(ended.stdout) if ended.stdout else None
 
 
-# --- what comes in -------------------------------------------------------------------------------------------------
+# --- requests ------------------------------------------------------------------------------------------------------
 
 
 def path_of(element):
-    """The WBEM URI of an INSTANCENAME."""
+    """Returns the WBEM URI of an INSTANCENAME."""
     keys = []
     for key in element.findall("KEYBINDING"):
         reference = key.find(".//INSTANCENAME")
@@ -67,7 +67,7 @@ def path_of(element):
 
 
 def values_of(element):
-    """The values of an INSTANCE, as cimhost-lab takes them."""
+    """Returns the values of an INSTANCE as arguments of cimhost-lab."""
     return [f'{each.get("NAME")}={each.findtext("VALUE") or ""}' for each in element.findall("PROPERTY")
             if each.find("VALUE") is not None]
 
@@ -77,7 +77,7 @@ def namespace_of(call):
 
 
 def parameters_of(call):
-    """The parameters by their names; classes and instances that are named, as URIs with the namespace."""
+    """Returns the parameters by name; names of classes and instances as URIs with the namespace."""
     uri = namespace_of(call) + ":"
     read = {"CLASSNAME": lambda child: uri + child.get("NAME"), "INSTANCENAME": lambda child: uri + path_of(child),
             "VALUE": lambda child: child.text or "", "VALUE.ARRAY": lambda child: [each.text for each in child]}
@@ -86,7 +86,7 @@ def parameters_of(call):
 
 
 def options_of(given):
-    """The options of cimhost that say what a request asks for."""
+    """Returns the options of cimhost for the parameters of a request."""
     options = [f"--property={name}" for name in given.get("PropertyList", [])]
     for parameter, option in (("AssocClass", "assoc-class"), ("ResultClass", "result-class"), ("Role", "role"),
                               ("ResultRole", "result-role")):
@@ -95,7 +95,7 @@ def options_of(given):
     return options
 
 
-# --- what goes out -------------------------------------------------------------------------------------------------
+# --- responses -----------------------------------------------------------------------------------------------------
 
 
 def text_of(value):
@@ -162,7 +162,7 @@ def object_element(instance, parent):
     instance_element(instance, element)
 
 
-# What lists objects: the command of cimhost, the parameter that names where it begins, the form of an object.
+# Operations that list objects: cimhost's command, the parameter for its argument, the element of an object.
 LISTINGS = {"EnumerateInstances": ("ei", "ClassName", named_element),
             "EnumerateInstanceNames": ("ein", "ClassName", name_element),
             "Associators": ("ai", "ObjectName", object_element),
@@ -172,7 +172,7 @@ LISTINGS = {"EnumerateInstances": ("ei", "ClassName", named_element),
 
 
 def answer(manager, namespace, operation, given, value):
-    """Does one operation, and puts what it returns into an element."""
+    """Performs an operation and adds the results to an element."""
     if operation == "GetClass":
         listed = [each for each in manager.ask("classes") if f'{namespace}:{each["class"]}' == given["ClassName"]]
         if not listed:
@@ -194,7 +194,7 @@ def answer(manager, namespace, operation, given, value):
     elif operation == "DeleteInstance":
         manager.ask("di", given["InstanceName"])
     else:
-        raise CimError("7", f"{operation} is not done here")
+        raise CimError("7", f"{operation} is not implemented")
 
 
 def message(manager, request):
@@ -210,13 +210,13 @@ def message(manager, request):
             response.append(value)
     except CimError as error:
         xml.SubElement(response, "ERROR", CODE=error.code, DESCRIPTION=str(error))
-    # wbemcli reads neither elements that begin and end at once nor references to characters.
+    # wbemcli supports neither empty-element tags nor character references.
     text = xml.tostring(cim, encoding="unicode", short_empty_elements=False)
     return ('<?xml version="1.0" encoding="utf-8"?>\n' + text).encode()
 
 
 class Server:
-    """Listens at a free port of the loopback interface until it is left."""
+    """A context manager that listens on a free port of the loopback interface."""
 
     def __init__(self, manager):
         class Handler(http.server.BaseHTTPRequestHandler):

@@ -1,4 +1,4 @@
-"""Finds the manual pages, and reads those in docs/man: the terms of their lists and their examples."""
+"""Finds the manual pages, and reads the list terms and examples of those in docs/man."""
 
 import gzip
 import pathlib
@@ -9,7 +9,7 @@ DIRECTORY = ROOT / "docs" / "man"
 
 
 def all_pages(directory):
-    """The pages of a build tree or an installation."""
+    """Returns the pages of a build tree or an installation."""
     return sorted((directory / "share" / "man").glob("man?/*"))
 
 
@@ -23,14 +23,14 @@ def source_of(path):
 
 
 class Page:
-    """A page in mdoc, whose requests stand in lines of their own."""
+    """A page in mdoc format."""
 
     def __init__(self, name):
         self.path = DIRECTORY / name
         self.lines = self.path.read_text(encoding="utf-8").splitlines()
 
     def terms(self, heading=""):
-        """What the lists explain: the line of each .It, below a heading that has that text or in the whole page."""
+        """Returns the line of each .It, below the heading or in the complete page."""
         below = not heading
         found = []
         for line in self.lines:
@@ -41,15 +41,15 @@ class Page:
         return found
 
     def options(self):
-        """The options that are explained, as they are typed."""
+        """Returns the documented options with their dashes."""
         return {"-" + flag for term in self.terms() for flag in re.findall(r"\bFl (-?[\w-]+)", term)}
 
     def words(self, macro, heading=""):
-        """The words behind a macro in the terms, such as those of commands behind Cm."""
+        """Returns the words after a macro in the terms, such as commands after Cm."""
         return [word for term in self.terms(heading) for word in re.findall(rf"\b{macro} (?!\|)(\S+)", term)]
 
     def examples(self):
-        """The texts that are shown as they are."""
+        """Returns the literal displays."""
         text = "\n".join(self.lines)
         shown = re.findall(r"^\.Bd -literal.*\n((?:.*\n)*?)\.Ed", text, re.MULTILINE)
         return [each.replace("\\e", "\\") for each in shown]

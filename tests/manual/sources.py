@@ -1,4 +1,4 @@
-"""Finds texts for people among the literals of C++ sources, and in what the command that registers says."""
+"""Finds the messages among the literals of C++ sources and in shell scripts."""
 
 import re
 
@@ -6,7 +6,7 @@ from pages import ROOT
 
 TOKEN = re.compile(r'//[^\n]*|/\*.*?\*/|#include[^\n]*|static_assert\([^;]*;'
                    r'|\'(?:\\.|[^\'\\\n])\'|"(?:\\.|[^"\\\n])*"', re.S)
-# Names and messages that the lease and the warranty side derive from one word.
+# Names and messages that are derived from the kind of record.
 KINDS = ("Lease", "Warranty")
 DERIVED = re.compile(r'\{((?:"[^"]*"|kind|className)(?:, (?:"[^"]*"|kind|className))+)\}')
 ESCAPES = {"n": "\n", "r": "\r", "t": "\t", "0": "\0"}
@@ -18,14 +18,14 @@ def files(*folders):
 
 
 def derived(match):
-    """The strings that a FixedString has for each kind of records, as literals."""
+    """Returns the values of a FixedString for each kind of record, as literals."""
     pieces = match[1].split(", ")
     return ", ".join('"' + "".join(kind if piece in ("kind", "className") else piece.strip('"') for piece in pieces)
                      + '"' for kind in KINDS)
 
 
 def literals(text):
-    """The literals of a source in their order, those that stand together as one."""
+    """Returns the literals of a source in order. Adjacent literals are concatenated."""
     found, end = [], None
     text = DERIVED.sub(derived, text)
     for token in TOKEN.finditer(text):
@@ -41,18 +41,19 @@ def literals(text):
 
 
 def is_prose(text):
-    """Several words, or a part of a sentence that something else goes before or after. A trace's label is none."""
+    """Returns whether a literal is part of a message: several words, or a word with a blank at an end. Labels of
+    parameter lists are no messages."""
     several = re.search(r"[A-Za-z][,.;:)'\"]* +[(\"']?[A-Za-z]", text)
     part = re.search(r"^ .*[A-Za-z]|[A-Za-z].* $", text)
     return bool(several or part) and not re.fullmatch(r" \w+=?", text)
 
 
-SAID = re.compile(r'echo "\$\{lines:-([^}]*)\}"'
-                  r'|\b(?:say|complain|failed|done_saying|wrong_usage|sfcb_leave|echo) "((?:[^"\\]|\\.)*)"')
+MESSAGE = re.compile(r'echo "\$\{lines:-([^}]*)\}"'
+                  r'|\b(?:say|complain|failed|report_change|wrong_usage|sfcb_abandon|echo) "((?:[^"\\]|\\.)*)"')
 VALUE = re.compile(r"\$\([^)]*\)|\$\{[^}]*\}|\$\w+|\$[@*?]|@\w+@")
 
 
-def said(text, placeholder):
-    """What a shell script says to people, with a word in the place of each value."""
-    texts = [VALUE.sub(placeholder, each[1] or each[2] or "") for each in SAID.finditer(text)]
+def shell_messages(text, placeholder):
+    """Returns the messages of a shell script, with a placeholder for each value."""
+    texts = [VALUE.sub(placeholder, each[1] or each[2] or "") for each in MESSAGE.finditer(text)]
     return [each for each in texts if is_prose(each.replace(placeholder, ""))]

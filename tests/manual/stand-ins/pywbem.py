@@ -1,4 +1,4 @@
-"""Stands for the module of that name, as far as the documents use it: what it is asked for is asked of cimhost."""
+"""Stand-in for the module pywbem as far as the documents use it. Performs the requests with cimhost-lab."""
 
 import os
 import pathlib

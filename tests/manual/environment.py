@@ -1,4 +1,4 @@
-"""Where a test runs what a document shows: an agent of its own, the programs of the build tree, stand-ins."""
+"""An environment for commands of documents: a separate agent, the programs of the build tree, and stand-ins."""
 
 import os
 import pathlib
@@ -12,9 +12,9 @@ STAND_INS = ROOT / "tests" / "packaging" / "stand-ins" / "stand-in"
 HERE = pathlib.Path(__file__).resolve().parent
 
 
-class Surroundings:
+class Environment:
     """@param build     the build tree, or an installation
-    @param stand_ins  commands that record what they are told"""
+    @param stand_ins  commands to replace by stand-ins"""
 
     def __init__(self, build, stand_ins=()):
         place = tempfile.TemporaryDirectory()
@@ -45,7 +45,7 @@ class Surroundings:
         return next(place for place in places if (place / name).exists())
 
     def placed(self, text, **replaced):
-        """A text with this run's places instead of those that an installation has."""
+        """Replaces the directories of an installation in a text by those of this run."""
         places = {"/tmp": self.directory,
                   "/usr/share/lease-warranty-provider": self.build / "share" / "lease-warranty-provider",
                   "/usr/lib/x86_64-linux-gnu/cmpi": self.libraries(), "/var/log": self.directory,
@@ -60,21 +60,21 @@ class Surroundings:
                               stdout=subprocess.PIPE, stderr=subprocess.STDOUT)
 
     def shell(self, text, **replaced):
-        """What the commands say, none of which may fail."""
+        """Returns the output of shell commands, which must succeed."""
         ended = self.run("bash", "-eu", "-o", "pipefail", "-c", self.placed(text, **replaced))
         if ended.returncode != 0:
-            raise AssertionError(f"status {ended.returncode} of\n{text}\nwhich says\n{ended.stdout}")
+            raise AssertionError(f"status {ended.returncode} of\n{text}\nwith the output\n{ended.stdout}")
         return ended.stdout
 
     def cimhost(self, *arguments):
-        """What cimhost says; it may not fail."""
+        """Returns the output of cimhost, which must succeed."""
         ended = self.run("cimhost", *arguments)
         if ended.returncode != 0:
             raise AssertionError(f"{arguments} ended with {ended.returncode}: {ended.stdout}")
         return ended.stdout
 
     def data(self, name):
-        """The lines of a data file."""
+        """Returns the lines of a data file."""
         return (self.data_directory / name).read_text(encoding="utf-8").splitlines()
 
     def write_data(self, name, text):
