@@ -176,7 +176,7 @@ sfcb_setting() { # NAME
 }
 
 # Warns if SFCB may not find the library. It looks it up by its name in the directories that the configuration lists,
-# by default in cmpi below the directory of its own libraries, among others.
+# by default in cmpi below the directory of SFCB's libraries, among others.
 sfcb_check_library() {
     directories=$(sfcb_setting providerDirs) || {
         say "SFCB may not find the library: $sfcb_config cannot be read; its line providerDirs must contain $libraries"

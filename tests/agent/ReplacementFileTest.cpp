@@ -63,11 +63,11 @@ TEST(ReplacementFile, KeepsTheOwner) {
 
 /** Returns the attributes of a file after an unprivileged user with write access to its directory has replaced it. */
 struct stat statusAfterReplacement(const TemporaryDirectory& directory, const std::vector<gid_t>& groupsOfReplacer) {
-    constexpr uid_t somebody = 65534;
-    EXPECT_EQ(::chown(directory.path().c_str(), somebody, somebody), 0);
+    constexpr uid_t otherUser = 65534;
+    EXPECT_EQ(::chown(directory.path().c_str(), otherUser, otherUser), 0);
     const auto replaceAsSomebody = [&] {
-        if (::setgroups(groupsOfReplacer.size(), groupsOfReplacer.data()) != 0 || ::setgid(somebody) != 0 ||
-            ::setuid(somebody) != 0) {
+        if (::setgroups(groupsOfReplacer.size(), groupsOfReplacer.data()) != 0 || ::setgid(otherUser) != 0 ||
+            ::setuid(otherUser) != 0) {
             std::_Exit(2);
         }
         replaceFile(directory.file("file"), "new");

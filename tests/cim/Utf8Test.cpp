@@ -44,7 +44,7 @@ INSTANTIATE_TEST_SUITE_P(
                     Case{"overlong slash", "\xC0\xAF", 0xC0, 1, false},
                     Case{"overlong three bytes", "\xE0\x80\xAF", 0xE0, 1, false},
                     Case{"a surrogate", "\xED\xA0\x80", 0xED, 1, false}, Case{"cut off", "\xE2\x82", 0xE2, 1, false},
-                    Case{"broken off", "\xE2\x82x", 0xE2, 1, false},
+                    Case{"truncated", "\xE2\x82x", 0xE2, 1, false},
                     Case{"never a first byte", "\xFF", 0xFF, 1, false}));
 
 TEST(Utf8, IsDecodedAsItIsEncoded) {

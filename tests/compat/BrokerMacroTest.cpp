@@ -158,11 +158,11 @@ TEST_F(BrokerMacros, SetAStatus) {
 }
 
 TEST_F(BrokerMacros, IgnoreANullStatus) {
-    CMPIStatus* const nobody = nullptr;
+    CMPIStatus* const noStatus = nullptr;
     recorder::calls.clear();
     makers.newString = recorder::record<CMPIString*, const CMPIBroker*, const char*, CMPIStatus*>;
-    CMSetStatus(nobody, CMPI_RC_ERROR);
-    CMSetStatusWithChars(broker, nobody, CMPI_RC_ERROR, name);
+    CMSetStatus(noStatus, CMPI_RC_ERROR);
+    CMSetStatusWithChars(broker, noStatus, CMPI_RC_ERROR, name);
     EXPECT_TRUE(recorder::calls.empty());
 }
 

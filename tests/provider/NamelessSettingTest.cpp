@@ -26,7 +26,7 @@ using namespace providerTest;
 TYPED_TEST_SUITE(SettingElement, SettingKinds, KindNames);
 
 TYPED_TEST(SettingElement, FailsOnAnUnnamedComputerBeforeTheMatch) {
-    for (const char* name : {"behind", "nobody"}) {
+    for (const char* name : {"behind", "unknown"}) {
         EXPECT_EQ(thrown<InstrumentationException>([&] {
                       this->toElement({{"Name", name}});
                   }),

@@ -49,7 +49,7 @@ TYPED_TEST(Rewrite, HappensWhenACursorWithChangesIsDestroyed) {
 
 TYPED_TEST(Rewrite, DoesNotHappenAfterReading) {
     this->fill({"A"});
-    write(this->path(), "edited by somebody else");
+    write(this->path(), "edited by another program");
     {
         typename TypeParam::Base base;
         EXPECT_TRUE(hasCurrent(base));
@@ -58,7 +58,7 @@ TYPED_TEST(Rewrite, DoesNotHappenAfterReading) {
         ++base;
         EXPECT_FALSE(hasCurrent(base));
     }
-    EXPECT_EQ(this->file(), "edited by somebody else");
+    EXPECT_EQ(this->file(), "edited by another program");
 }
 
 TYPED_TEST(Rewrite, DoesNotHappenAfterARejectedChange) {

@@ -102,7 +102,7 @@ TYPED_TEST(SettingElement, SelectsAgainRegardlessOfTheCurrentRecord) {
     EXPECT_EQ(toElement("alpha"), alpha) << "the element is at its record";
     EXPECT_EQ(toComputer("/system/third"), (Keys{{"Name", "beta"}}));
     EXPECT_EQ(toElement("alpha"), alpha);
-    EXPECT_EQ(toElement("nobody"), (Keys{{"InstanceID", ""}}));
+    EXPECT_EQ(toElement("unknown"), (Keys{{"InstanceID", ""}}));
     EXPECT_EQ(toElement("beta"), beta);
     EXPECT_EQ(toComputer("/system/first%20box"), (Keys{{"Name", "alpha"}}));
 }

@@ -193,12 +193,12 @@ TEST_P(RecordRequestTest, ADeletedRecordCanBeCreatedAgainAtTheEnd) {
 TEST_P(RecordRequestTest, ReadingDoesNotRewriteTheFile) {
     writeData(kind().dataFile, dataOfNew({"A"}));
     EXPECT_THAT(identifiers(), ElementsAre("A"));
-    writeData(kind().dataFile, "written by somebody else");
+    writeData(kind().dataFile, "written by another program");
     EXPECT_EQ(recordOf("A"), kind().shownRecord("A"));
     provider().enumerateInstances(allPath());
     EXPECT_THAT(modify("A", {}), isOk(0));
     EXPECT_THAT(remove("missing"), isOk(0));
-    EXPECT_EQ(data(), "written by somebody else");
+    EXPECT_EQ(data(), "written by another program");
 }
 
 TEST_P(RecordRequestTest, AChangeOverwritesExternalChangesOfTheFile) {
