@@ -19,7 +19,7 @@ int localOffset(std::time_t moment) {
 
 }  // namespace
 
-/** Holds the date as its CIM datetime string, to keep all digits of the client; empty for no date. */
+/** Stores the date as its CIM datetime string, to keep all digits of the client; empty for no date. */
 struct DateTime::Implementation {
     std::string text;
 };

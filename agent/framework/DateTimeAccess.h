@@ -6,7 +6,7 @@
 
 namespace KO {
 
-/** Gives the framework's other classes access to the content of a DateTime. */
+/** Grants the framework's other classes access to the content of a DateTime. */
 class DateTimeAccess {
 public:
     /** The CIM datetime of a date; empty for no date. */

@@ -6,7 +6,7 @@
 
 namespace KO {
 
-/** Gives KO::Utils access to the entries of a property file. */
+/** Grants KO::Utils access to the entries of a property file. */
 class PropertyFileAccess {
 public:
     /** The value of a key, empty if it is absent. @throws FrameworkException if the file is not open */

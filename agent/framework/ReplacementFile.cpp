@@ -43,7 +43,7 @@ public:
     TemporaryFile(const TemporaryFile&) = delete;
     TemporaryFile& operator=(const TemporaryFile&) = delete;
 
-    /** Copies mode and owner of the file to replace. If that file is gone, only the owner has access. */
+    /** Copies mode and owner of the file to replace. If that file does not exist, only the owner has access. */
     void adoptAttributes(const std::string& target) {
         struct stat status {};
         if (::stat(target.c_str(), &status) != 0) {

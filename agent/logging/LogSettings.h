@@ -15,7 +15,7 @@ struct LogSettings {
     Destination destination = Destination::none;
     std::string file;                     ///< path of the log file; empty for the other destinations
     std::size_t rotationSize = 10485760;  ///< bytes after which the file is rotated
-    std::size_t rotationCount = 5;        ///< how many rotated files are kept
+    std::size_t rotationCount = 5;        ///< number of rotated files to keep
     Levels levels;
 };
 

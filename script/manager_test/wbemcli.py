@@ -157,7 +157,7 @@ class Client:
         return self.send("gi", path)
 
     def create(self, class_name, **values):
-        """Creates an instance; wbemcli wants a path, and sends only the values."""
+        """Creates an instance; wbemcli requires a path, but sends only the values."""
         return self.send("ci", Path.of(class_name, InstanceID="new"), assigned(values))
 
     def modify(self, path, **values):

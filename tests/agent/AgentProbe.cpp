@@ -1,4 +1,4 @@
-// A process that uses the agent's libraries with the configuration of its environment and prints what they return. The
+// A process that uses the agent's libraries with the configuration of its environment and prints their results. The
 // first argument is the action.
 
 #include "KO/Instrumentation.h"

@@ -73,8 +73,8 @@ protected:
     }
 
     /**
-     * Returns the possible instances after a failed change: the instances before it, unless the message says that the
-     * file may have changed.
+     * Returns the possible instances after a failed change: the instances before it, unless the message reports that
+     * the file may have changed.
      */
     std::vector<Lines> possible(const Fault& fault, const std::string& message) const {
         if (message.find("asset.dat may differ from what it was before") == std::string::npos) {

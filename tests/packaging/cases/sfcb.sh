@@ -95,7 +95,7 @@ ends_with 1
 says "the previous registration was restored"
 diff -r "$work/before" "$work/elsewhere" >"$work/output" || complain "the directories are not as they were"
 for directory in stage registration; do
-    [ "$(readlink "$STAND_IN/sfcb/$directory")" = "../../elsewhere/$directory" ] || complain "$directory is no link any more"
+    [ "$(readlink "$STAND_IN/sfcb/$directory")" = "../../elsewhere/$directory" ] || complain "$directory is not a link anymore"
 done
 [ -z "$(find "$STAND_IN/sfcb" -name 'before-*')" ] || complain "copies are left"
 
@@ -109,7 +109,7 @@ register register
 ends_with 1
 says "could not be restored; it is in $STAND_IN/sfcb/before-"
 says_nothing_of "was restored"
-grep -q "static instance" "$STAND_IN"/sfcb/before-*/registration/repository/instances || complain "the copy is not there"
+grep -q "static instance" "$STAND_IN"/sfcb/before-*/registration/repository/instances || complain "the copy is missing"
 
 begin "SFCB: changes nothing if the copies cannot be made"
 machine "${sfcb[@]}" cp

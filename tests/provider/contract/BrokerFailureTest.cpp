@@ -52,7 +52,7 @@ TEST_P(BrokerFailureTest, NothingIsReturnedIfNoPathCanBeCreated) {
     EXPECT_EQ(broker.count("CMPIResultFT.returnObjectPath"), 0);
     EXPECT_EQ(broker.count("CMPIResultFT.returnInstance"), 0);
     EXPECT_EQ(broker.count(newInstance), 0) << "no instance is created without a path";
-    EXPECT_EQ(broker.count(newObjectPath), 6) << "each record is tried";
+    EXPECT_EQ(broker.count(newObjectPath), 6) << "the creation is tried for each record";
 }
 
 TEST_P(BrokerFailureTest, AnInstanceThatCannotBeCreatedIsOmitted) {

@@ -46,7 +46,7 @@ std::vector<std::string> identifiersOf(const std::vector<Instance>& instances);
 std::vector<std::string> shown(const std::vector<NamedValue>& values);
 
 /** @name The log
- * Records of the log channel, unless a channel is given.
+ * Records of a channel, by default the log channel.
  */
 ///@{
 std::vector<LogRecord> logOf(const std::string& channel = "log");

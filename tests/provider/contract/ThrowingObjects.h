@@ -5,7 +5,7 @@
 #include <memory>
 #include <utility>
 
-// Broker objects with individually replaced functions, for example by ones that throw.
+// Broker objects of which tests replace single functions, for example by functions that throw.
 
 namespace contract {
 

@@ -70,7 +70,7 @@ TEST_F(TranscriptPropertyTest, LevelsMatchTheKindOfRecord) {
         EXPECT_THAT(foundMessages, Contains(message)) << "no scenario contains it";
     }
     EXPECT_THAT(foundMessages, Contains(loudMessage));
-    EXPECT_EQ(foundRaised.size(), 18U) << "a function at error level is in no scenario";
+    EXPECT_EQ(foundRaised.size(), 18U) << "functions whose entry or exit is at error level";
 }
 
 TEST_F(TranscriptPropertyTest, TheDetailMessageIsWrittenOncePerOpen) {
