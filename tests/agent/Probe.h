@@ -7,7 +7,7 @@ namespace agent_test {
 
 /** Exit code and output of a probe process. */
 struct ProbeResult {
-    int exitCode;  // /< -1 if the process was killed by a signal
+    int exitCode;  ///< -1 if the process was killed by a signal
     std::string output;
     std::string errors;
 };

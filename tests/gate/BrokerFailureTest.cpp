@@ -7,7 +7,7 @@
 
 #include "schema/MofWriter.h"
 
-// Brokers whose functions fail, answer nothing or throw.
+// Brokers whose functions fail, return null or throw.
 
 namespace gatetest {
 namespace {
@@ -17,7 +17,7 @@ using testing::HasSubstr;
 
 constexpr CMPIrc brokerCode = CMPI_RC_ERR_ACCESS_DENIED;
 
-/** What the gate calls of a broker, itself or through the provider, besides what makes its messages. */
+/** Broker functions that the gate calls, directly or through the provider, except for its error messages. */
 const std::vector<std::string> functions{
     "CMPIBrokerEncFT.newObjectPath",    "CMPIBrokerEncFT.newInstance",   "CMPIBrokerEncFT.newDateTimeFromChars",
     "CMPIBrokerFT.enumerateInstances",  "CMPIObjectPathFT.addKey",       "CMPIObjectPathFT.getNameSpace",
@@ -28,37 +28,37 @@ const std::vector<std::string> functions{
     "CMPIResultFT.returnInstance",      "CMPIResultFT.returnObjectPath", "CMPIResultFT.returnDone",
 };
 
-/** Those of which the provider passes over a failure, on objects of the broker's: the gate cannot see that. */
-const std::set<std::string> passedOver{"CMPIObjectPathFT.addKey",    "CMPIObjectPathFT.getKeyCount",
-                                       "CMPIObjectPathFT.getKey",    "CMPIObjectPathFT.getKeyAt",
-                                       "CMPIInstanceFT.setProperty", "CMPIBrokerEncFT.newDateTimeFromChars"};
+/** Functions whose failure the provider ignores on objects of the broker, so that the gate does not notice it. */
+const std::set<std::string> ignoredByProvider{"CMPIObjectPathFT.addKey",    "CMPIObjectPathFT.getKeyCount",
+                                              "CMPIObjectPathFT.getKey",    "CMPIObjectPathFT.getKeyAt",
+                                              "CMPIInstanceFT.setProperty", "CMPIBrokerEncFT.newDateTimeFromChars"};
 
-/** A result that fails may have passed on what it was given before. */
+/** A failing function of the result may have accepted an object before. */
 bool isOfResult(const std::string& function) {
     return function.find("CMPIResultFT.") == 0;
 }
 
-/** Two leases, the first of which no request of these tests names. */
+/** Two leases. The requests of these tests do not address the first one. */
 class BrokerFailureTest : public GateTest {
 protected:
     using Operation = std::function<Outcome()>;
 
     BrokerFailureTest() {
-        create("bystander", {named("Lessor", text("First"))});
-        create(secondPlace, {named("Lessor", text("ACME")), named("LeaseTerm", uint32(1)),
-                             named("BaseTermCommencementDate", testsupport::dateTime("20260101000000.000000+060"))});
+        create("other lease", {named("Lessor", text("First"))});
+        create(secondNode, {named("Lessor", text("ACME")), named("LeaseTerm", uint32(1)),
+                            named("BaseTermCommencementDate", testsupport::dateTime("20260101000000.000000+060"))});
     }
 
     std::map<std::string, Operation> operations() {
-        const ObjectPath path = keyedPath(lease, secondPlace);
+        const ObjectPath path = keyedPath(lease, secondNode);
         const cimhost::PropertyList list{{"Lessor"}};
         return {
             {"enumerate", [=] { return gate().enumerateInstances(classPath(lease), list); }},
             {"enumerateNames", [=] { return gate().enumerateInstanceNames(classPath(lease)); }},
             {"get", [=] { return gate().getInstance(path, list); }},
             {"create", [=] { return create("L3", {named("Lessor", text("New"))}); }},
-            {"modify", [=] { return modify(secondPlace, {named("Lessor", text("Other"))}); }},
-            {"delete", [=] { return remove(secondPlace); }},
+            {"modify", [=] { return modify(secondNode, {named("Lessor", text("Other"))}); }},
+            {"delete", [=] { return remove(secondNode); }},
             {"associators", [=] { return gate().associators(path, {}, list); }},
             {"associatorNames", [=] { return gate().associatorNames(computerPath("beta"), {}); }},
             {"references", [=] { return gate().references(path, {}); }},
@@ -66,7 +66,7 @@ protected:
         };
     }
 
-    /** How often a good run of the operation calls a function; the operation's effects are undone. */
+    /** Counts the calls of a function in a successful run of the operation, and reverts the operation's changes. */
     int callsOf(const std::string& function, const Operation& operation) {
         broker.forget();
         const Outcome outcome = operation();
@@ -77,9 +77,9 @@ protected:
         return count;
     }
 
-    /** All that was answered, as text. */
+    /** Returns all returned objects as strings. */
     static std::vector<std::string> answersOf(const Outcome& outcome) {
-        std::vector<std::string> answers = shownPaths(outcome.paths());
+        std::vector<std::string> answers = formattedPaths(outcome.paths());
         for (const Instance& instance : outcome.instances()) {
             answers.push_back(testsupport::toText(instance.path));
             for (const NamedValue& property : instance.properties) {
@@ -89,14 +89,14 @@ protected:
         return answers;
     }
 
-    /** Makes the two leases what they were, whatever became of them. */
+    /** Restores the initial values of the two leases. */
     void restore() {
         gate().deleteInstance(keyedPath(lease, "L3"));
-        create(secondPlace);
-        EXPECT_THAT(modify(secondPlace,
-                           {named("Lessor", text("ACME")), named("LeaseTerm", uint32(1)),
-                            named("BaseTermCommencementDate", testsupport::dateTime("20260101000000.000000+060"))}),
-                    isDone());
+        create(secondNode);
+        EXPECT_THAT(
+            modify(secondNode, {named("Lessor", text("ACME")), named("LeaseTerm", uint32(1)),
+                                named("BaseTermCommencementDate", testsupport::dateTime("20260101000000.000000+060"))}),
+            isDone());
     }
 
     std::vector<std::string> state() {
@@ -107,20 +107,20 @@ protected:
         return shown;
     }
 
-    void expectSaneAnswer(const Outcome& outcome, const std::string& what) {
+    void expectValidResponse(const Outcome& outcome, const std::string& what) {
         EXPECT_FALSE(outcome.threw) << what;
         if (outcome.rc != CMPI_RC_OK) {
             EXPECT_FALSE(outcome.message.empty()) << what;
         }
-        EXPECT_THAT(state(), testing::Contains("bystander First")) << what;
+        EXPECT_THAT(state(), testing::Contains("other lease First")) << what;
     }
 
-    std::vector<std::string> good{};  ///< what the operation answers when nothing fails
+    std::vector<std::string> good{};  ///< results of the operation without failures
 };
 
 class EachOperationTest : public BrokerFailureTest, public testing::WithParamInterface<const char*> {};
 
-TEST_P(EachOperationTest, EachFunctionMayFailAtEachCall) {
+TEST_P(EachOperationTest, ReturnsNoPartialResultIfAnyCallFails) {
     const Operation operation = operations().at(GetParam());
     const std::vector<std::string> before = state();
     for (const std::string& function : functions) {
@@ -130,13 +130,14 @@ TEST_P(EachOperationTest, EachFunctionMayFailAtEachCall) {
             broker.failCall(function, call, brokerCode);
             const Outcome outcome = operation();
             broker.obey();
-            expectSaneAnswer(outcome, what);
+            expectValidResponse(outcome, what);
             if (outcome.rc == CMPI_RC_OK) {
-                EXPECT_TRUE(answersOf(outcome) == good || passedOver.count(function) != 0)
-                    << what << ": a part is no good answer";
+                EXPECT_TRUE(answersOf(outcome) == good || ignoredByProvider.count(function) != 0)
+                    << what << ": OK with a partial result";
             } else {
                 EXPECT_EQ(state(), before) << what << ": " << outcome.message;
-                EXPECT_TRUE(answersOf(outcome).empty() || isOfResult(function)) << what << ": a part went out";
+                EXPECT_TRUE(answersOf(outcome).empty() || isOfResult(function))
+                    << what << ": a partial result was returned";
             }
             restore();
             ASSERT_FALSE(HasFailure()) << what;
@@ -144,13 +145,13 @@ TEST_P(EachOperationTest, EachFunctionMayFailAtEachCall) {
     }
 }
 
-TEST_P(EachOperationTest, EachFunctionMayAnswerNothingAlways) {
+TEST_P(EachOperationTest, SurvivesFunctionsThatReturnNull) {
     const Operation operation = operations().at(GetParam());
     for (const std::string& function : functions) {
         broker.answerNothingEver(function);
         const Outcome outcome = operation();
         broker.obey();
-        expectSaneAnswer(outcome, function + " answers nothing");
+        expectValidResponse(outcome, function + " answers nothing");
         restore();
     }
 }
@@ -160,7 +161,7 @@ INSTANTIATE_TEST_SUITE_P(Gate, EachOperationTest,
                                          "associators", "associatorNames", "references", "enumerateAssociations"),
                          [](const auto& parameter) { return std::string(parameter.param); });
 
-TEST_F(BrokerFailureTest, AnAnswerThatCannotBeMadeWholeIsNotGivenInPart) {
+TEST_F(BrokerFailureTest, ReturnsNothingIfAnObjectCannotBeCreated) {
     for (const char* maker : {"CMPIBrokerEncFT.newObjectPath", "CMPIBrokerEncFT.newInstance"}) {
         broker.failCall(maker, 2, brokerCode);
         EXPECT_THAT(gate().enumerateInstances(classPath(lease)), isRefused(CMPI_RC_ERR_FAILED, "object manager"));
@@ -168,7 +169,7 @@ TEST_F(BrokerFailureTest, AnAnswerThatCannotBeMadeWholeIsNotGivenInPart) {
     }
 }
 
-TEST_F(BrokerFailureTest, ComputersThatCannotAllBeHadAreNoGoodAnswer) {
+TEST_F(BrokerFailureTest, FailsIfNotAllComputersCanBeEnumerated) {
     const auto refused = isRefused(CMPI_RC_ERR_FAILED, "enumerate VELKO_ComputerSystem");
     broker.failCall("CMPIEnumerationFT.hasNext", 2, brokerCode);
     EXPECT_THAT(gate().associatorNames(computerPath("alpha"), {}), refused);
@@ -177,18 +178,18 @@ TEST_F(BrokerFailureTest, ComputersThatCannotAllBeHadAreNoGoodAnswer) {
     EXPECT_THAT(gate().enumerateInstances(classPath(leaseSetting)), refused);
     broker.obey();
     broker.failEvery("CMPIObjectPathFT.getKeyCount", brokerCode);
-    EXPECT_THAT(gate().references(keyedPath(lease, secondPlace), {}), isRefused(CMPI_RC_ERR_FAILED, "count the keys"));
+    EXPECT_THAT(gate().references(keyedPath(lease, secondNode), {}), isRefused(CMPI_RC_ERR_FAILED, "count the keys"));
     EXPECT_THAT(gate().enumerateInstances(classPath(leaseSetting)), isRefused(CMPI_RC_ERR_FAILED, "count the keys"));
 }
 
-TEST_F(BrokerFailureTest, AReasonThatTheManagerDoesNotTakeIsAnsweredByAFixedText) {
+TEST_F(BrokerFailureTest, ReturnsAFixedMessageIfTheBrokerCannotCreateStrings) {
     broker.answerNothingEver("CMPIBrokerEncFT.newString");
     EXPECT_THAT(gate().getInstance(keyedPath(lease, "missing")),
                 isRefused(CMPI_RC_ERR_NOT_FOUND, "error message could not be created"));
     EXPECT_THAT(gate().execQuery(classPath(lease), "WQL", "select"), isRefused(CMPI_RC_ERR_NOT_SUPPORTED, "Enumerate"));
 }
 
-/** A broker that throws from one of its functions, at one of the next calls. */
+/** A broker one of whose functions throws in one of the next calls. */
 struct ThrowingBroker {
     static inline int callsUntilThrow = 0;
     static inline bool throwsStandard = false;
@@ -215,7 +216,7 @@ struct ThrowingBroker {
     CMPIBroker broker;
 };
 
-TEST_F(BrokerFailureTest, NoExceptionOfAnyKindLeavesAndTheNextRequestIsServed) {
+TEST_F(BrokerFailureTest, CatchesAllExceptionsAndServesTheNextRequest) {
     ThrowingBroker throwing(*broker.handle());
     gate().createInstanceMI(&throwing.broker, nullptr);
     gate().createAssociationMI(&throwing.broker, nullptr);
@@ -226,7 +227,7 @@ TEST_F(BrokerFailureTest, NoExceptionOfAnyKindLeavesAndTheNextRequestIsServed) {
                 ThrowingBroker::callsUntilThrow = call;
                 const Outcome outcome = operation();
                 ThrowingBroker::callsUntilThrow = 0;
-                expectSaneAnswer(outcome, name);
+                expectValidResponse(outcome, name);
                 restore();
             }
         }
@@ -234,10 +235,10 @@ TEST_F(BrokerFailureTest, NoExceptionOfAnyKindLeavesAndTheNextRequestIsServed) {
     ThrowingBroker::callsUntilThrow = 1;
     ThrowingBroker::throwsStandard = false;
     EXPECT_THAT(gate().enumerateInstances(classPath(lease)), isRefused(CMPI_RC_ERR_FAILED, "exception"));
-    unload();  // before the broker goes
+    unload();  // before the broker is destroyed
 }
 
-TEST_F(BrokerFailureTest, LooseBrokersServe) {
+TEST_F(BrokerFailureTest, WorksWithBrokersThatSetNoStates) {
     for (const auto manager : {testsupport::Manager::sfcb, testsupport::Manager::openPegasus}) {
         testsupport::RecordingBroker loose;
         loose.emulate(manager);

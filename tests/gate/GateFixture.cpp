@@ -7,7 +7,7 @@
 #include "schema/MofWriter.h"
 #include "support/UnderTest.h"
 
-/** Two computers, told apart by name and place. */
+/** Two computers with different names and node paths. */
 const char* const agentNodes = R"(
 [[instrumentation.node]]
 type = 1
@@ -87,7 +87,7 @@ std::vector<std::string> identifiersOf(const std::vector<Instance>& instances) {
     return identifiers;
 }
 
-std::vector<std::string> shownPaths(const std::vector<ObjectPath>& paths) {
+std::vector<std::string> formattedPaths(const std::vector<ObjectPath>& paths) {
     std::vector<std::string> shown;
     for (const ObjectPath& path : paths) {
         shown.push_back(testsupport::toText(path));
@@ -144,8 +144,8 @@ void GateTest::close() {
 
 void GateTest::unload() {
     close();
-    EXPECT_FALSE(isLoaded(testsupport::underTest(GATE_LIBRARY))) << "the gate stays in the process";
-    EXPECT_FALSE(isLoaded(testsupport::underTest(PROVIDER_LIBRARY))) << "the provider stays in the process";
+    EXPECT_FALSE(isLoaded(testsupport::underTest(GATE_LIBRARY))) << "the gate is still loaded";
+    EXPECT_FALSE(isLoaded(testsupport::underTest(PROVIDER_LIBRARY))) << "the provider is still loaded";
 }
 
 Outcome GateTest::create(const std::string& id, std::vector<NamedValue> properties, const std::string& of) {
@@ -168,7 +168,7 @@ std::vector<std::string> GateTest::identifiers(const std::string& of) {
     return identifiersOf(outcome.paths());
 }
 
-Instance GateTest::got(const std::string& id, const std::string& of) {
+Instance GateTest::instanceOf(const std::string& id, const std::string& of) {
     const Outcome outcome = gate().getInstance(keyedPath(of, id));
     EXPECT_THAT(outcome, isAnswered(1)) << id;
     return outcome.instances().empty() ? Instance{} : outcome.instances().front();

@@ -35,38 +35,40 @@ constexpr const char* agent = "VELKO_OstrelAgent";
 constexpr const char* leaseSetting = "VELKO_LeaseSetting";
 constexpr const char* warrantySetting = "VELKO_WarrantySetting";
 
-/** The places of the two computers in the agent's tree: identifiers of what belongs to them. */
-constexpr const char* firstPlace = "/system/computer1";
-constexpr const char* secondPlace = "/system/computer2";
+/** Node paths of the two computers in the agent's tree: the InstanceIDs of their leases and warranties. */
+constexpr const char* firstNode = "/system/computer1";
+constexpr const char* secondNode = "/system/computer2";
 
 ObjectPath classPath(const std::string& className);
 ObjectPath keyedPath(const std::string& className, const std::string& instanceId);
 ObjectPath computerPath(const std::string& name);
 
-/** The value of a property as text: of a string or datetime its characters, else as MOF writes it. None if null. */
+/**
+ * Returns a property's value: the characters of a string or datetime, otherwise its MOF representation. None if null.
+ */
 std::optional<std::string> valueIn(const Instance& instance, const std::string& property);
 
 std::vector<std::string> identifiersOf(const std::vector<ObjectPath>& paths);
 std::vector<std::string> identifiersOf(const std::vector<Instance>& instances);
 
-/** The paths as texts, in an order of their own. */
-std::vector<std::string> shownPaths(const std::vector<ObjectPath>& paths);
+/** Returns the paths as sorted strings. */
+std::vector<std::string> formattedPaths(const std::vector<ObjectPath>& paths);
 
-/** That a request went well, with this many answers. */
+/** Matches a successful request with this number of results. */
 testing::Matcher<const Outcome&> isAnswered(int answers);
 
-/** That a change that answers nothing went well. */
+/** Matches a successful request without results. */
 testing::Matcher<const Outcome&> isDone();
 
-/** That a request was refused with a code and a message that has these words, and nothing was answered. */
+/** Matches a request that failed with this code and a message with these words, without results. */
 testing::Matcher<const Outcome&> isRefused(CMPIrc rc, const std::string& words);
 
-/** Whether a shared library is in the process. */
+/** Returns whether a shared library is loaded. */
 bool isLoaded(const std::string& file);
 
 /**
- * The gate's library over the provider and an agent that knows two computers, "alpha" and "beta"; the broker serves
- * both. The library is loaded at the first need, so files written before are what the provider loads.
+ * The gate's library over the provider and an agent with two computers, "alpha" and "beta", which the broker serves,
+ * too. The library is loaded by the first call of gate(), so the provider loads files that were written before.
  */
 class GateTest : public testing::Test {
 protected:
@@ -75,23 +77,23 @@ protected:
 
     testsupport::ProviderLibrary& gate();
 
-    /** Closes the library; the next gate() loads it again if it went. */
+    /** Closes the library; the next gate() loads it again if it was unloaded. */
     void close();
 
-    /** The same; that it and the provider do not go is a failure of the test. */
+    /** Closes the library. Fails the test if the gate or the provider stays loaded. */
     void unload();
 
-    /** @name Requests for a lease, unless a class is named */
+    /** @name Requests for a lease, or for the named class */
     ///@{
     Outcome create(const std::string& id, std::vector<NamedValue> properties = {}, const std::string& of = lease);
     Outcome modify(const std::string& id, std::vector<NamedValue> properties, const std::string& of = lease);
     Outcome remove(const std::string& id, const std::string& of = lease);
     std::vector<std::string> identifiers(const std::string& of = lease);
 
-    /** The one instance of that identifier; a failure of the test without it. */
-    Instance got(const std::string& id, const std::string& of = lease);
+    /** Returns the instance with the identifier; fails the test if there is none. */
+    Instance instanceOf(const std::string& id, const std::string& of = lease);
 
-    /** The only instance of a class. */
+    /** Returns the only instance of a class. */
     Instance only(const std::string& className);
     ///@}
 
@@ -103,7 +105,7 @@ private:
     std::unique_ptr<testsupport::ProviderLibrary> library;
 };
 
-/** Turns the refusal off in the agent's configuration while it lives. */
+/** Permits lossy values in the agent's configuration during its lifetime. */
 class RefusalOff {
 public:
     RefusalOff() : before(testsupport::readFile(file())) {

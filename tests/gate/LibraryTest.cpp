@@ -6,7 +6,7 @@
 #include "broker/RequestScope.h"
 #include "support/UnderTest.h"
 
-// The built library as a file, its factories, its coming and going.
+// The built library file, its factories, loading and unloading.
 
 namespace gatetest {
 namespace {
@@ -16,7 +16,7 @@ using testing::HasSubstr;
 using testing::IsEmpty;
 using testing::Not;
 
-/** What a command of the shell writes, errors included. */
+/** Returns the output of a shell command, including the error stream. */
 std::string outputOf(const std::string& command) {
     const std::unique_ptr<FILE, int (*)(FILE*)> pipe(popen((command + " 2>&1").c_str(), "r"), &pclose);
     std::string output;
@@ -42,17 +42,17 @@ TEST_F(LibraryTest, FindsTheProviderBesideItself) {
                 AllOf(HasSubstr("[libLeaseAndWarrantyProvider.so]"), HasSubstr("[$ORIGIN")));
 }
 
-TEST_F(LibraryTest, LeavesNoSymbolOpen) {
+TEST_F(LibraryTest, HasNoUndefinedSymbol) {
     const std::string relocations = outputOf("LD_PRELOAD= ldd -r " + gateFile());
     EXPECT_THAT(relocations, HasSubstr("libLeaseAndWarrantyProvider.so =>"));
-    // A build with sanitizers finds their functions in the program.
+    // In a build with sanitizers, the program defines their functions.
     if (outputOf("nm --dynamic " + gateFile()).find("san_init") == std::string::npos) {
         EXPECT_THAT(relocations, Not(HasSubstr("undefined symbol")));
     }
     EXPECT_THAT(relocations, Not(HasSubstr("not found")));
 }
 
-TEST_F(LibraryTest, AFactoryWithoutBrokerSaysSo) {
+TEST_F(LibraryTest, AFactoryCallWithoutBrokerFailsWithAMessage) {
     CMPIStatus status{CMPI_RC_OK, nullptr};
     EXPECT_EQ(gate().createInstanceMI(nullptr, &status), nullptr);
     EXPECT_EQ(status.rc, CMPI_RC_ERR_INVALID_PARAMETER);
@@ -62,10 +62,10 @@ TEST_F(LibraryTest, AFactoryWithoutBrokerSaysSo) {
     EXPECT_EQ(status.rc, CMPI_RC_ERR_INVALID_PARAMETER);
     EXPECT_THAT(cimhost::statusFrom(status).message, HasSubstr("without a broker"));
     EXPECT_EQ(gate().createInstanceMI(nullptr, nullptr), nullptr);
-    EXPECT_THAT(create("L1"), isAnswered(1)) << "a good factory call fixes it";
+    EXPECT_THAT(create("L1"), isAnswered(1)) << "after a valid factory call";
 }
 
-TEST_F(LibraryTest, FactoriesMayBeCalledAgainAndAgain) {
+TEST_F(LibraryTest, FactoriesCanBeCalledRepeatedly) {
     CMPIStatus status{CMPI_RC_ERR_FAILED, nullptr};
     CMPIInstanceMI* first = gate().createInstanceMI(broker.handle(), &status);
     EXPECT_NE(first, nullptr);
@@ -76,7 +76,7 @@ TEST_F(LibraryTest, FactoriesMayBeCalledAgainAndAgain) {
     EXPECT_EQ(first->ft->miVersion, CMPIVersion200);
 }
 
-TEST_F(LibraryTest, TheBrokerOfTheLatestFactoryCallServes) {
+TEST_F(LibraryTest, UsesTheBrokerOfTheLatestFactoryCall) {
     gate().createInstanceMI(broker.handle(), nullptr);
     create("L1");
     testsupport::RecordingBroker other;
@@ -86,17 +86,17 @@ TEST_F(LibraryTest, TheBrokerOfTheLatestFactoryCallServes) {
     EXPECT_THAT(identifiers(), ElementsAre("L1"));
     EXPECT_GT(other.count("CMPIBrokerEncFT.newObjectPath"), 0);
     EXPECT_EQ(broker.count("CMPIBrokerEncFT.newObjectPath"), 0);
-    unload();  // before the other broker goes
+    unload();  // before the other broker is destroyed
 }
 
-TEST_F(LibraryTest, StaysWhileIdle) {
+TEST_F(LibraryTest, RefusesToUnloadWhileIdle) {
     create("L1");
     EXPECT_THAT(gate().cleanupInstanceMI(false), isRefused(CMPI_RC_DO_NOT_UNLOAD, "memory"));
     EXPECT_THAT(gate().cleanupAssociationMI(false), isRefused(CMPI_RC_DO_NOT_UNLOAD, "memory"));
     EXPECT_THAT(identifiers(), ElementsAre("L1"));
 }
 
-TEST_F(LibraryTest, ComesAndGoesAgainAndAgain) {
+TEST_F(LibraryTest, CanBeLoadedAndUnloadedRepeatedly) {
     for (int round = 0; round < 3; ++round) {
         EXPECT_THAT(identifiers(), testing::SizeIs(round));
         create("L" + std::to_string(round));
@@ -104,7 +104,7 @@ TEST_F(LibraryTest, ComesAndGoesAgainAndAgain) {
     }
 }
 
-TEST_F(LibraryTest, CallsNothingOfTheBrokerUntilItIsAsked) {
+TEST_F(LibraryTest, DoesNotCallTheBrokerBeforeTheFirstRequest) {
     EXPECT_NE(gate().instanceMI(), nullptr);
     EXPECT_NE(gate().associationMI(), nullptr);
     EXPECT_THAT(broker.calls(), IsEmpty());

@@ -12,7 +12,7 @@ using testsupport::Form;
 using testsupport::ModelRecord;
 using testsupport::RecordModel;
 
-/** Some value of a field as the model writes it. */
+/** Returns a value of a field in the model's format. */
 std::string valueOf(Form form, int number) {
     switch (form) {
         case Form::number:
@@ -39,7 +39,7 @@ cimhost::Value cimValue(Form form, const std::string& value) {
     }
 }
 
-/** Whether an instance shows all values of a record. */
+/** Returns whether an instance has all values of a record. */
 bool shows(const LoadedKind& kind, const Instance& instance, const ModelRecord& record) {
     const RecordModel model(kind.fields);
     return model.shownFields(instance) == model.shown(record);
@@ -115,72 +115,72 @@ void LoadClient::expect(bool holds, const std::string& what, const cimhost::Stat
     }
 }
 
-/** What is shared all clients create; one of them succeeds. */
+/** Creates a record. All clients create shared records; one of them succeeds. */
 void LoadClient::create(const LoadedKind& kind, const std::string& id, int value, bool isShared) {
     const ModelRecord record = filledRecord(kind, id, value);
     const cimhost::Status status = gate.create(id, propertiesOf(kind, record), kind.className);
     expect(status.ok() || (isShared && status.rc == CMPI_RC_ERR_ALREADY_EXISTS), "creating " + id, status);
     if (status.ok()) {
-        told.records[kind.className][id] = record;
+        expected.records[kind.className][id] = record;
     }
 }
 
 void LoadClient::read(const LoadedKind& kind, const std::string& id) {
     const auto answer = gate.manager().perform(Request::getInstance(keyedPath(kind.className, id)));
     expect(answer.ok(), "getting " + id, answer.status);
-    expect(shows(kind, answer.instance(), told.records[kind.className][id]), "the values of " + id);
+    expect(shows(kind, answer.instance(), expected.records[kind.className][id]), "values of " + id);
 }
 
 void LoadClient::modify(const LoadedKind& kind, const std::string& id, int value) {
     const ModelRecord record = filledRecord(kind, id, value);
     const auto status = gate.modify(keyedPath(kind.className, id), propertiesOf(kind, record));
     expect(status.ok(), "modifying " + id, status);
-    told.records[kind.className][id] = record;
+    expected.records[kind.className][id] = record;
 }
 
 void LoadClient::remove(const LoadedKind& kind, const std::string& id) {
     const auto status = gate.remove(id, kind.className);
     expect(status.ok(), "deleting " + id, status);
-    told.records[kind.className].erase(id);
+    expected.records[kind.className].erase(id);
 }
 
-/** Everything that is this client's own is there, once, and as it was told. */
+/** Checks that each record of this client is listed once, with its expected values. */
 void LoadClient::enumerate(const LoadedKind& kind) {
     const auto answer = gate.manager().perform(Request::enumerateInstances(classPath(kind.className)));
     expect(answer.ok(), "enumerating", answer.status);
-    const Told::Records& own = told.records[kind.className];
+    const ExpectedState::Records& own = expected.records[kind.className];
     std::set<std::string> seen;
     for (const Instance& instance : answer.instances) {
         const std::string id = valueIn(instance, "InstanceID").value_or("(none)");
-        expect(seen.insert(id).second, id + " is there twice");
+        expect(seen.insert(id).second, id + " is listed twice");
         const auto found = own.find(id);
-        expect(found == own.end() || shows(kind, instance, found->second), "the listed values of " + id);
+        expect(found == own.end() || shows(kind, instance, found->second), "listed values of " + id);
     }
     for (const auto& [id, record] : own) {
         expect(seen.count(id) == 1, id + " is missing");
     }
 }
 
-/** An up-call in each: the computers are another provider's. */
+/** Finds the records of the computer. Each request makes an up-call, since another provider serves computers. */
 void LoadClient::associate(const LoadedKind& kind) {
-    expectBelongings(kind, "alpha", {firstPlace});
-    expectComputer(kind, firstPlace, "alpha");
+    expectRecordsOf(kind, "alpha", {firstNode});
+    expectComputer(kind, firstNode, "alpha");
 }
 
-/** The second computer has a record, and has it no more. */
+/** Creates and deletes the record of the second computer. */
 void LoadClient::move(const LoadedKind& kind, int round) {
-    create(kind, secondPlace, round + 1, false);
-    expectBelongings(kind, "beta", {secondPlace});
-    expectComputer(kind, secondPlace, "beta");
-    remove(kind, secondPlace);
-    expectBelongings(kind, "beta", {});
+    create(kind, secondNode, round + 1, false);
+    expectRecordsOf(kind, "beta", {secondNode});
+    expectComputer(kind, secondNode, "beta");
+    remove(kind, secondNode);
+    expectRecordsOf(kind, "beta", {});
 }
 
-void LoadClient::expectBelongings(const LoadedKind& kind, const char* computer,
-                                  const std::vector<std::string>& identifiers) {
+void LoadClient::expectRecordsOf(const LoadedKind& kind, const char* computer,
+                                 const std::vector<std::string>& identifiers) {
     const auto names =
         gate.manager().perform(Request::associatorNames(computerPath(computer), {kind.setting, {}, {}, {}}));
-    expect(names.ok() && identifiersOf(names.paths) == identifiers, std::string("what belongs to ") + computer,
+    expect(names.ok() && identifiersOf(names.paths) == identifiers, std::string("records of ") + computer,
            names.status);
     const auto references =
         gate.manager().perform(Request::referenceNames(computerPath(computer), {{}, kind.setting, {}, {}}));
@@ -188,11 +188,11 @@ void LoadClient::expectBelongings(const LoadedKind& kind, const char* computer,
            references.status);
 }
 
-void LoadClient::expectComputer(const LoadedKind& kind, const char* place, const std::string& computer) {
+void LoadClient::expectComputer(const LoadedKind& kind, const char* identifier, const std::string& computer) {
     const auto found =
-        gate.manager().perform(Request::associators(keyedPath(kind.className, place), {kind.setting, {}, {}, {}}));
+        gate.manager().perform(Request::associators(keyedPath(kind.className, identifier), {kind.setting, {}, {}, {}}));
     const bool isIt = found.instances.size() == 1 && valueIn(found.instance(), "Name") == computer;
-    expect(found.ok() && isIt, std::string("the computer of ") + place, found.status);
+    expect(found.ok() && isIt, std::string("computer of ") + identifier, found.status);
 }
 
 void LoadClient::changeAsset(int round) {
@@ -204,7 +204,7 @@ void LoadClient::changeAsset(int round) {
     const std::string value = "client " + std::to_string(number) + " round " + std::to_string(round);
     const auto status = gate.modify(assetPath(), {named(property, text(value))});
     expect(status.ok(), std::string("changing ") + property, status);
-    told.asset[property] = value;
+    expected.asset[property] = value;
     const auto answer = gate.manager().perform(Request::getInstance(assetPath()));
     expect(answer.ok() && valueIn(answer.instance(), property) == value, std::string("reading ") + property,
            answer.status);

@@ -15,40 +15,41 @@ struct LoadedKind {
     const testsupport::ModelFields& fields;
 };
 
-/** Leases and warranties. */
+/** Returns the classes of leases and warranties. */
 const std::vector<LoadedKind>& loadedKinds();
 
-/** The asset properties that clients change: each belongs to the client whose number is its place. */
+/** Returns the asset properties that clients change. The client with the index of a property changes it. */
 const std::vector<const char*>& loadedAssetProperties();
 
-/** What somebody was told is there: all fields of records, and asset data. */
-struct Told {
+/** Expected records and asset data, according to the responses to a client. */
+struct ExpectedState {
     using Records = std::map<std::string, testsupport::ModelRecord>;  ///< by identifier
 
     std::map<std::string, Records> records;    ///< by class
     std::map<std::string, std::string> asset;  ///< by property
 };
 
-/** A record with values in all fields, which depend on the number. */
+/** Returns a record with values in all fields, derived from the number. */
 testsupport::ModelRecord filledRecord(const LoadedKind& kind, const std::string& id, int number);
 
-/** The properties of a record, as a client sends them. */
+/** Returns the properties of a record, as a client sends them. */
 std::vector<NamedValue> propertiesOf(const LoadedKind& kind, const testsupport::ModelRecord& record);
 
 /**
- * One of many clients of a gate over two computers, the first of which has a lease and a warranty. It creates, reads,
- * changes, enumerates, associates and deletes; client 0 besides gives the second computer a lease and a warranty and
- * takes them away. It notes what goes wrong instead of failing the test, which only the main thread may do.
+ * One of the concurrent clients of a gate with two computers, the first of which has a lease and a warranty. It
+ * creates, reads, changes, enumerates, associates and deletes. Client 0 also creates and deletes a lease and a
+ * warranty of the second computer. Failures are collected in `problems`, since only the main thread may fail the
+ * test.
  */
 class LoadClient {
 public:
-    /** @param itsNumber from 0 */
+    /** @param itsNumber number of the client, from 0 */
     LoadClient(ManagedGate& itsGate, int itsNumber) : gate(itsGate), number(itsNumber) {}
 
-    /** A round of requests about each class. @param round from 0; in odd ones its own records go again */
+    /** Runs requests about each class. @param round from 0; odd rounds delete the client's own records */
     void work(int round);
 
-    Told told;
+    ExpectedState expected;
     std::vector<std::string> problems;
 
 private:
@@ -61,8 +62,8 @@ private:
     void enumerate(const LoadedKind& kind);
     void associate(const LoadedKind& kind);
     void move(const LoadedKind& kind, int round);
-    void expectBelongings(const LoadedKind& kind, const char* computer, const std::vector<std::string>& identifiers);
-    void expectComputer(const LoadedKind& kind, const char* place, const std::string& computer);
+    void expectRecordsOf(const LoadedKind& kind, const char* computer, const std::vector<std::string>& identifiers);
+    void expectComputer(const LoadedKind& kind, const char* identifier, const std::string& computer);
     void changeAsset(int round);
 
     ManagedGate& gate;

@@ -6,7 +6,7 @@
 #include "lab/emulation/ManagerEmulation.h"
 #include "support/Files.h"
 
-// Many clients at a time: what they were told, what the tables hold and what the files hold are the same.
+// Concurrent clients: after a mixed load, responses, tables and files agree.
 
 namespace gatetest {
 namespace {
@@ -18,16 +18,16 @@ using testsupport::RecordModel;
 
 constexpr int rounds = 3;
 
-/** All that clients were told of a class, in the order of the identifiers. */
-RecordModel modelOf(const LoadedKind& kind, const Told& told) {
+/** Returns the expected records of a class, sorted by identifier. */
+RecordModel modelOf(const LoadedKind& kind, const ExpectedState& expected) {
     RecordModel model(kind.fields);
-    for (const auto& [id, record] : told.records.at(kind.className)) {
+    for (const auto& [id, record] : expected.records.at(kind.className)) {
         model.records.push_back(record);
     }
     return model;
 }
 
-/** What the instances of a class show. */
+/** Returns the values of a class's instances. */
 std::vector<std::vector<std::string>> inTable(ManagedGate& gate, const LoadedKind& kind) {
     const auto answer = gate.manager().perform(cimhost::Request::enumerateInstances(classPath(kind.className)));
     EXPECT_TRUE(answer.ok()) << answer.status.message;
@@ -38,18 +38,18 @@ std::vector<std::vector<std::string>> inTable(ManagedGate& gate, const LoadedKin
     return shown;
 }
 
-/** A record file line by line, with the records in the order of their identifiers. */
+/** Returns a record file with its records sorted by identifier. */
 std::string inFile(const LoadedKind& kind) {
     const std::string content = testsupport::readFile(agentEnvironment::dataDirectory() / kind.file);
     RecordModel model(kind.fields);
     model.read(content);
-    EXPECT_EQ(model.written(), content) << "there is more in the file than its records";
+    EXPECT_EQ(model.written(), content) << "the file contains only records";
     std::sort(model.records.begin(), model.records.end());
     return model.written();
 }
 
-std::map<std::string, std::string> assetShown(ManagedGate& gate) {
-    const Instance instance = gate.got(gate.paths(asset).at(0));
+std::map<std::string, std::string> assetInTable(ManagedGate& gate) {
+    const Instance instance = gate.instanceOf(gate.paths(asset).at(0));
     std::map<std::string, std::string> shown;
     for (const char* property : loadedAssetProperties()) {
         shown[property] = valueIn(instance, property).value_or("(none)");
@@ -57,8 +57,8 @@ std::map<std::string, std::string> assetShown(ManagedGate& gate) {
     return shown;
 }
 
-/** The values in the file of asset data that are not empty. */
-std::vector<std::string> assetStored() {
+/** Returns the non-empty values of the asset data file. */
+std::vector<std::string> assetInFile() {
     std::istringstream file(testsupport::readFile(agentEnvironment::dataDirectory() / "asset.dat"));
     std::vector<std::string> values;
     for (std::string line; std::getline(file, line);) {
@@ -70,19 +70,19 @@ std::vector<std::string> assetStored() {
     return values;
 }
 
-void expectAgreement(ManagedGate& gate, const Told& told) {
+void expectAgreement(ManagedGate& gate, const ExpectedState& expected) {
     for (const LoadedKind& kind : loadedKinds()) {
-        const RecordModel model = modelOf(kind, told);
+        const RecordModel model = modelOf(kind, expected);
         EXPECT_THAT(inTable(gate, kind), UnorderedElementsAreArray(model.shownRecords())) << kind.className;
         EXPECT_EQ(inFile(kind), model.written()) << kind.file;
-        EXPECT_THAT(gate.paths(kind.setting), testing::SizeIs(1)) << "that of the first computer";
+        EXPECT_THAT(gate.paths(kind.setting), testing::SizeIs(1)) << "the association of the first computer";
     }
-    EXPECT_EQ(assetShown(gate), told.asset);
+    EXPECT_EQ(assetInTable(gate), expected.asset);
     std::vector<std::string> stored;
-    for (const auto& [property, value] : told.asset) {
+    for (const auto& [property, value] : expected.asset) {
         stored.push_back(value);
     }
-    EXPECT_THAT(assetStored(), UnorderedElementsAreArray(stored));
+    EXPECT_THAT(assetInFile(), UnorderedElementsAreArray(stored));
 }
 
 class LoadTest : public testing::TestWithParam<Manager> {
@@ -90,36 +90,36 @@ protected:
     LoadTest() { agentEnvironment::clear(); }
     ~LoadTest() override { agentEnvironment::clear(); }
 
-    /** Gives the first computer a lease and a warranty. */
-    static Told begin(ManagedGate& gate) {
-        Told told;
+    /** Creates a lease and a warranty of the first computer. */
+    static ExpectedState createFirst(ManagedGate& gate) {
+        ExpectedState expected;
         for (const LoadedKind& kind : loadedKinds()) {
-            const auto record = filledRecord(kind, firstPlace, 1);
-            EXPECT_TRUE(gate.create(firstPlace, propertiesOf(kind, record), kind.className).ok());
-            told.records[kind.className][firstPlace] = record;
+            const auto record = filledRecord(kind, firstNode, 1);
+            EXPECT_TRUE(gate.create(firstNode, propertiesOf(kind, record), kind.className).ok());
+            expected.records[kind.className][firstNode] = record;
         }
-        return told;
+        return expected;
     }
 
-    /** Takes over what a client was told, of which nobody else was told. */
-    static void gather(Told& all, const LoadClient& client) {
+    /** Merges the expectations of a client, which are disjoint from those of the others. */
+    static void merge(ExpectedState& all, const LoadClient& client) {
         EXPECT_THAT(client.problems, IsEmpty());
-        for (const auto& [className, records] : client.told.records) {
+        for (const auto& [className, records] : client.expected.records) {
             for (const auto& [id, record] : records) {
                 EXPECT_TRUE(all.records[className].emplace(id, record).second) << id << " was created twice";
             }
         }
-        all.asset.insert(client.told.asset.begin(), client.told.asset.end());
+        all.asset.insert(client.expected.asset.begin(), client.expected.asset.end());
     }
 
     SilentLog silence;
 };
 
 TEST_P(LoadTest, ClientsTablesAndFilesAgreeAfterAMixedLoad) {
-    Told told;
+    ExpectedState expected;
     {
         ManagedGate gate(GetParam());
-        told = begin(gate);
+        expected = createFirst(gate);
         std::vector<LoadClient> clients;
         for (int number = 0; number < clientCount; ++number) {
             clients.emplace_back(gate, number);
@@ -130,12 +130,12 @@ TEST_P(LoadTest, ClientsTablesAndFilesAgreeAfterAMixedLoad) {
             }
         });
         for (const LoadClient& client : clients) {
-            gather(told, client);
+            merge(expected, client);
         }
-        expectAgreement(gate, told);
+        expectAgreement(gate, expected);
     }
     ManagedGate again(GetParam());
-    expectAgreement(again, told);
+    expectAgreement(again, expected);
 }
 
 INSTANTIATE_TEST_SUITE_P(Gate, LoadTest, testing::ValuesIn(cimhost::lab::everyManager), cimhost::lab::ManagerName());

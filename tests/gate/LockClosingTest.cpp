@@ -1,4 +1,4 @@
-#include "Diary.h"
+#include "EventLog.h"
 #include "gate/session/ProviderSession.h"
 
 #include <gmock/gmock.h>
@@ -14,7 +14,7 @@
 #include <thread>
 #include <vector>
 
-// The request lock while it closes, when it is closed, and when it is opened again.
+// The request lock: closing, closed and reopened.
 
 namespace gatetest {
 namespace {
@@ -36,54 +36,54 @@ TEST(LockClosingTest, AClosedLockAdmitsNoRequest) {
     lock.endRequest();
     EXPECT_TRUE(lock.close(longEnough));
     EXPECT_FALSE(lock.beginRequest());
-    EXPECT_FALSE(lock.close(longEnough)) << "it was closed already";
+    EXPECT_FALSE(lock.close(longEnough)) << "it was already closed";
 }
 
 TEST(LockClosingTest, ClosingWaitsForTheHolderAndTheQueue) {
     RequestLock lock;
-    Diary diary;
+    EventLog log;
     std::vector<std::thread> threads;
     const auto request = [&](const std::string& name) {
         lock.beginRequest();
         ASSERT_TRUE(lock.acquire());
-        diary.note(name + " inside");
+        log.note(name + " inside");
         if (name == "first") {
-            diary.await("go on");
+            log.await("go on");
         }
-        diary.note(name + " done");
+        log.note(name + " done");
         lock.release();
         lock.endRequest();
     };
     threads.emplace_back(request, "first");
-    diary.await("first inside");
+    log.await("first inside");
     threads.emplace_back(request, "second");
     awaitQueue(lock, 1);
     threads.emplace_back([&] {
         lock.close(longEnough);
-        diary.note("closed");
+        log.note("closed");
     });
     awaitClosing(lock);
-    EXPECT_THAT(diary.all(), ElementsAre("first inside"));
-    diary.note("go on");
+    EXPECT_THAT(log.all(), ElementsAre("first inside"));
+    log.note("go on");
     join(threads);
-    EXPECT_THAT(diary.all(),
+    EXPECT_THAT(log.all(),
                 ElementsAre("first inside", "go on", "first done", "second inside", "second done", "closed"));
 }
 
 TEST(LockClosingTest, AfterTheTimeoutClosingWaitsForTheHolderOnly) {
     RequestLock lock;
-    Diary diary;
+    EventLog log;
     lock.beginRequest();
     ASSERT_TRUE(lock.acquire());
     std::thread closer([&] {
         lock.close(std::chrono::seconds(0));
-        diary.note("closed");
+        log.note("closed");
     });
     awaitClosing(lock);
-    diary.note("releasing");
+    log.note("releasing");
     lock.release();
     closer.join();
-    EXPECT_THAT(diary.all(), ElementsAre("releasing", "closed")) << "before it departs";
+    EXPECT_THAT(log.all(), ElementsAre("releasing", "closed")) << "before the request ends";
     lock.endRequest();
 }
 
@@ -112,26 +112,26 @@ TEST(LockClosingTest, AClosingLockCanBeReacquired) {
 
 TEST(LockClosingTest, ReacquiringAClosedLockWaitsUntilItIsOpened) {
     RequestLock lock;
-    Diary diary;
+    EventLog log;
     std::thread late([&] {
         lock.beginRequest();
         EXPECT_TRUE(lock.acquire());
         lock.release();
-        diary.note("released");
-        diary.await("shut");
+        log.note("released");
+        log.await("shut");
         lock.reacquire();
-        diary.note("again");
+        log.note("again");
         lock.release();
         lock.endRequest();
     });
-    diary.await("released");
+    log.await("released");
     EXPECT_TRUE(lock.close(std::chrono::seconds(0)));
-    diary.note("shut");
+    log.note("shut");
     awaitQueue(lock, 1);
-    diary.note("opened");
+    log.note("opened");
     lock.open();
     late.join();
-    EXPECT_THAT(diary.all(), ElementsAre("released", "shut", "opened", "again"));
+    EXPECT_THAT(log.all(), ElementsAre("released", "shut", "opened", "again"));
     EXPECT_TRUE(lock.beginRequest());
     lock.endRequest();
 }
@@ -150,21 +150,21 @@ TEST(LockClosingTest, ReacquiringInAGenerationFailsOnceTheLockHasBeenClosed) {
     EXPECT_TRUE(lock.open());
     EXPECT_NE(lock.generation(), generation);
     EXPECT_FALSE(lock.reacquire(generation)) << "its object manager has ended";
-    EXPECT_TRUE(lock.acquire()) << "the failed call does not hold it";
+    EXPECT_TRUE(lock.acquire()) << "the failed call does not acquire it";
     lock.release();
 }
 
-TEST(LockClosingTest, ClosingRefusesWaitersOfAGenerationAndKeepsTheOthers) {
+TEST(LockClosingTest, ClosingRefusesOnlyWaitersOfItsGeneration) {
     RequestLock lock;
-    Diary diary;
+    EventLog log;
     std::vector<std::thread> threads;
     const auto request = [&](const std::string& name, const std::function<bool()>& reacquire) {
         lock.beginRequest();
         EXPECT_TRUE(lock.acquire());
         lock.release();
-        diary.note(name + " released");
-        diary.await("ending");
-        diary.note(name + (reacquire() ? " again" : " refused"));
+        log.note(name + " released");
+        log.await("ending");
+        log.note(name + (reacquire() ? " again" : " refused"));
         lock.endRequest();
     };
     threads.emplace_back(request, "first", [&] { return lock.reacquire(0); });
@@ -173,46 +173,46 @@ TEST(LockClosingTest, ClosingRefusesWaitersOfAGenerationAndKeepsTheOthers) {
         lock.release();
         return true;
     });
-    diary.await("first released");
-    diary.await("second released");
+    log.await("first released");
+    log.await("second released");
     EXPECT_TRUE(lock.close(std::chrono::seconds(0), RequestLock::Closing::temporary, [&] {
-        diary.note("ending");
+        log.note("ending");
         awaitQueue(lock, 2);
     }));
-    diary.await("first refused");
+    log.await("first refused");
     EXPECT_EQ(lock.waiting(), 1U);
-    diary.note("opened");
+    log.note("opened");
     EXPECT_TRUE(lock.open());
     join(threads);
-    EXPECT_EQ(diary.all().back(), "second again");
+    EXPECT_EQ(log.all().back(), "second again");
 }
 
-TEST(LockClosingTest, TheEndIsCalledBeforeTheLockIsClosedWhileNoOtherThreadHoldsIt) {
+TEST(LockClosingTest, TheShutdownCallbackRunsWithTheLockHeldBeforeItIsClosed) {
     RequestLock lock;
-    Diary diary;
+    EventLog log;
     std::thread released([&] {
         lock.beginRequest();
         EXPECT_TRUE(lock.acquire());
         lock.release();
-        diary.note("released");
-        diary.await("ending");
+        log.note("released");
+        log.await("ending");
         lock.reacquire();
-        diary.note("again");
+        log.note("again");
         lock.release();
         lock.endRequest();
     });
-    diary.await("released");
+    log.await("released");
     EXPECT_TRUE(lock.close(std::chrono::seconds(0), RequestLock::Closing::temporary, [&] {
-        diary.note("ending");
+        log.note("ending");
         awaitQueue(lock, 1);
         EXPECT_FALSE(lock.open()) << "it closes";
         EXPECT_FALSE(lock.acquire());
-        diary.note("ended");
+        log.note("ended");
     }));
-    diary.note("opened");
+    log.note("opened");
     EXPECT_TRUE(lock.open());
     released.join();
-    EXPECT_THAT(diary.all(), ElementsAre("released", "ending", "ended", "opened", "again"));
+    EXPECT_THAT(log.all(), ElementsAre("released", "ending", "ended", "opened", "again"));
 }
 
 TEST(LockClosingTest, AWaitingCloserDoesNotCloseALockThatWasOpenedMeanwhile) {
@@ -290,19 +290,19 @@ TEST(LockClosingTest, ClosingDoesNotWaitForARequestOfTheCallingThread) {
 
 TEST(LockClosingTest, AForkedChildDoesNotWait) {
     RequestLock lock;
-    Diary diary;
+    EventLog log;
     std::thread inside([&] {
         lock.beginRequest();
         EXPECT_TRUE(lock.acquire());
-        diary.note("inside");
-        diary.await("forked");
+        log.note("inside");
+        log.await("forked");
         lock.release();
         lock.endRequest();
     });
-    diary.await("inside");
+    log.await("inside");
     const pid_t child = fork();
     if (child == 0) {
-        alarm(60);  // the only thread here would wait for one that is not
+        alarm(60);  // a parent's request would block the child forever
         lock.close(longEnough);
         _exit(7);
     }
@@ -310,7 +310,7 @@ TEST(LockClosingTest, AForkedChildDoesNotWait) {
     EXPECT_EQ(waitpid(child, &status, 0), child);
     EXPECT_TRUE(WIFEXITED(status));
     EXPECT_EQ(WEXITSTATUS(status), 7);
-    diary.note("forked");
+    log.note("forked");
     inside.join();
 }
 

@@ -4,7 +4,7 @@
 
 #include <dlfcn.h>
 
-// Values that the data files would not give back.
+// Values that do not survive a round trip through the data files.
 
 namespace gatetest {
 namespace {
@@ -26,7 +26,7 @@ const std::vector<std::pair<std::string, std::string>> lossyTexts{{"ACME_Leasing
                                                                   {"x", "one character"},
                                                                   {" ", "blank"}};
 
-TEST_F(LossyValuesTest, AreRefusedWithTheReasonBeforeAnythingIsStored) {
+TEST_F(LossyValuesTest, AreRefusedWithAReasonAndNothingIsStored) {
     create("L1", {named("Lessor", text("ACME"))});
     const std::string stored = testsupport::readFile(dataFile("Lease.dat"));
     for (const auto& [value, reason] : lossyTexts) {
@@ -38,7 +38,7 @@ TEST_F(LossyValuesTest, AreRefusedWithTheReasonBeforeAnythingIsStored) {
     EXPECT_THAT(identifiers(), ElementsAre("L1"));
 }
 
-TEST_F(LossyValuesTest, AreRefusedAsIdentifiersToo) {
+TEST_F(LossyValuesTest, AreRefusedAsIdentifiers) {
     for (const char* id : {"a_b", "a\tb", "a\nb", " a", "a ", "a  b"}) {
         EXPECT_THAT(create(id), isRefused(CMPI_RC_ERR_INVALID_PARAMETER, "InstanceID")) << id;
         EXPECT_THAT(create(id, {}, warranty), isRefused(CMPI_RC_ERR_INVALID_PARAMETER, "InstanceID")) << id;
@@ -51,7 +51,7 @@ TEST_F(LossyValuesTest, AreRefusedAsIdentifiersToo) {
     EXPECT_THAT(identifiers(), ElementsAre("x", "*", "a b", "/system/computer"));
 }
 
-TEST_F(LossyValuesTest, DatesThatAreNoneAreRefused) {
+TEST_F(LossyValuesTest, InvalidDatesAreRefused) {
     create("L1");
     for (const char* date : {"20261301000000.000000+000", "20260230000000.000000+000", "20260101240000.000000+000",
                              "2026010100****.******+000", "00000000000000.000000+060", "yesterday", ""}) {
@@ -61,19 +61,19 @@ TEST_F(LossyValuesTest, DatesThatAreNoneAreRefused) {
     }
     for (const char* date : {"20260101000000.000000+060", "00000012000000.000000:000"}) {
         EXPECT_THAT(modify("L1", {named("BaseTermCommencementDate", dateTime(date))}), isDone()) << date;
-        EXPECT_EQ(valueIn(got("L1"), "BaseTermCommencementDate"), date);
+        EXPECT_EQ(valueIn(instanceOf("L1"), "BaseTermCommencementDate"), date);
     }
 }
 
-TEST_F(LossyValuesTest, WhatIsKeptIsTaken) {
+TEST_F(LossyValuesTest, LosslessValuesAreAccepted) {
     create("L1");
     for (const char* value : {"ACME Leasing Co", "**", "", "1.250,00 \xe2\x82\xac", "\"quoted\""}) {
         EXPECT_THAT(modify("L1", {named("Lessor", text(value))}), isDone()) << value;
-        EXPECT_EQ(valueIn(got("L1"), "Lessor"), value);
+        EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), value);
     }
 }
 
-TEST_F(LossyValuesTest, AValueThatIsThereAlreadyMayComeBack) {
+TEST_F(LossyValuesTest, AStoredValueIsAcceptedAgain) {
     {
         const RefusalOff off;
         create("L1", {named("Lessor", text("ACME_Leasing"))});
@@ -81,32 +81,32 @@ TEST_F(LossyValuesTest, AValueThatIsThereAlreadyMayComeBack) {
     }
     testsupport::writeFile(dataFile("Lease.dat"),
                            "1\nL1\nA_\n00000000000000.000000-000\n0\n0\n0\n0\n0\n*\n*\n*\n*\n0\n");
-    EXPECT_EQ(valueIn(got("L1"), "Lessor"), "A ") << "a trailing blank, as the file tells it";
+    EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "A ") << "the file adds a trailing blank";
     EXPECT_THAT(modify("L1", {named("Lessor", text("A ")), named("LeaseTerm", uint32(3))}), isDone());
-    EXPECT_EQ(valueIn(got("L1"), "LeaseTerm"), "3");
+    EXPECT_EQ(valueIn(instanceOf("L1"), "LeaseTerm"), "3");
 }
 
-TEST_F(LossyValuesTest, AreTakenWhereTheOperatorWantsThat) {
+TEST_F(LossyValuesTest, AreAcceptedIfTheConfigurationPermitsThem) {
     const RefusalOff off;
     for (const char* value : {"ACME_Leasing", "a\ttab", " leading", "two  blanks", "*", "x"}) {
         const std::string id = "id_" + std::to_string(identifiers().size());
         EXPECT_THAT(create(id, {named("Lessor", text(value))}), isAnswered(1)) << value;
-        EXPECT_EQ(valueIn(got(id), "Lessor"), value);
+        EXPECT_EQ(valueIn(instanceOf(id), "Lessor"), value);
     }
-    EXPECT_THAT(create("two\nlines"), isRefused(CMPI_RC_ERR_FAILED, "does not hold")) << "the record cannot be found";
+    EXPECT_THAT(create("two\nlines"), isRefused(CMPI_RC_ERR_FAILED, "is too small")) << "has no identifier";
     EXPECT_THAT(create("L1", {named("Lessor", text("two\nlines"))}), isAnswered(1));
-    EXPECT_THAT(modify("L1", {named("LeaseTerm", uint32(3))}), isDone()) << "with lines that are too many";
+    EXPECT_THAT(modify("L1", {named("LeaseTerm", uint32(3))}), isDone()) << "has too many lines";
     EXPECT_THAT(remove("L1"), isDone());
-    unload();  // before the configuration is as it was
+    unload();  // before the configuration is restored
 }
 
-TEST_F(LossyValuesTest, DatesThatAreNoneAreTakenAsNoneWhereTheOperatorWantsThat) {
+TEST_F(LossyValuesTest, InvalidDatesBecomeNullIfTheConfigurationPermitsThem) {
     const RefusalOff off;
     const std::vector<std::string> none{"20261301000000.000000+000", "20260230000000.000000+000", "yesterday", ""};
     for (const std::string& date : none) {
         create("L1", {named("BaseTermCommencementDate", dateTime("20260101000000.000000+060"))});
         EXPECT_THAT(modify("L1", {named("BaseTermCommencementDate", text(date))}), isDone()) << date;
-        EXPECT_EQ(valueIn(got("L1"), "BaseTermCommencementDate"), std::nullopt) << date;
+        EXPECT_EQ(valueIn(instanceOf("L1"), "BaseTermCommencementDate"), std::nullopt) << date;
         EXPECT_THAT(remove("L1"), isDone());
         EXPECT_THAT(create("L1", {named("BaseTermCommencementDate", text(date))}), isAnswered(1)) << date;
         EXPECT_THAT(remove("L1"), isDone());
@@ -118,14 +118,14 @@ TEST_F(LossyValuesTest, DatesThatAreNoneAreTakenAsNoneWhereTheOperatorWantsThat)
                         isDone())
                 << property << ' ' << date;
         }
-        EXPECT_EQ(valueIn(only(asset), property), std::nullopt) << "an interval is no date there";
+        EXPECT_EQ(valueIn(only(asset), property), std::nullopt) << "an interval is not a date";
     }
-    unload();  // before the configuration is as it was
+    unload();  // before the configuration is restored
 }
 
-TEST_F(LossyValuesTest, AreRefusedAlsoWithAnAgentThatKnowsNoSwitches) {
+TEST_F(LossyValuesTest, AreRefusedWithAnAgentWithoutSettings) {
     const RefusalOff off;
-    // The one that is in the process already is the one that the gate finds.
+    // The gate uses the framework library that is loaded already.
     void* framework = dlopen(FRAMEWORK_WITHOUT_SETTINGS, RTLD_NOW | RTLD_LOCAL);
     ASSERT_NE(framework, nullptr) << dlerror();
     EXPECT_THAT(create("a_b"), isRefused(CMPI_RC_ERR_INVALID_PARAMETER, "underscore"));

@@ -53,7 +53,7 @@ std::vector<ObjectPath> ManagedGate::paths(const std::string& className) {
     return answer.paths;
 }
 
-Instance ManagedGate::got(const ObjectPath& path) {
+Instance ManagedGate::instanceOf(const ObjectPath& path) {
     auto answer = host->perform(Request::getInstance(path));
     EXPECT_TRUE(answer.ok()) << answer.status.message;
     return answer.instance();

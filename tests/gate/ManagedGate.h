@@ -6,12 +6,12 @@
 
 namespace gatetest {
 
-/** Who serves the classes. */
+/** The registered provider of the classes. */
 enum class Served { byGate, byProvider };
 
 /**
- * An object manager that emulates another one, with the gate (or the provider itself) and the provider of the computer
- * systems registered, over the classes of the schema. Its end closes the libraries.
+ * An emulated object manager with the gate (or the provider without it) and the provider of computer systems. Its
+ * destructor closes the libraries.
  */
 class ManagedGate {
 public:
@@ -19,14 +19,14 @@ public:
 
     cimhost::ObjectManager& manager() { return *host; }
 
-    /** @name Requests as a client makes them; a status other than OK is a failure of the test */
+    /** @name Requests of a client; fail the test on a status other than OK */
     ///@{
     std::vector<std::string> identifiers(const std::string& className);
     std::vector<ObjectPath> paths(const std::string& className);
-    Instance got(const ObjectPath& path);
+    Instance instanceOf(const ObjectPath& path);
     ///@}
 
-    /** @name Requests that may fail: the status that the client gets, with the message that the provider itself gave */
+    /** @name Requests that may fail: return the client's status with the provider's message */
     ///@{
     cimhost::Status ask(const cimhost::Request& request);
     cimhost::Status create(const std::string& id, std::vector<NamedValue> properties, const std::string& of = lease);
@@ -38,7 +38,7 @@ private:
     std::unique_ptr<cimhost::ObjectManager> host;
 };
 
-/** Keeps the agent's log silent while it lives: thousands of requests would fill the disk. */
+/** Disables the agent's log during its lifetime, since thousands of requests would fill the disk. */
 class SilentLog {
 public:
     SilentLog();

@@ -2,7 +2,7 @@
 #include "lab/emulation/ManagerEmulation.h"
 #include "support/UnderTest.h"
 
-// Whole lives of instances, under object managers as they are.
+// Instances from creation to deletion, under each emulated object manager.
 
 namespace gatetest {
 namespace {
@@ -20,7 +20,7 @@ protected:
     ManagerTest() { agentEnvironment::clear(); }
     ~ManagerTest() override { agentEnvironment::clear(); }
 
-    /** A failure has a message, and nothing else has one. */
+    /** Expects a status; only a failure has a message. */
     void expectStatus(const cimhost::Status& status, CMPIrc rc) {
         EXPECT_EQ(status.rc, rc) << status.message;
         EXPECT_EQ(status.message.empty(), rc == CMPI_RC_OK);
@@ -36,10 +36,10 @@ TEST_P(ManagerTest, LeasesAndWarrantiesAreCreatedReadChangedAndDeleted) {
         expectStatus(gate.create("A1", {}, of), CMPI_RC_ERR_ALREADY_EXISTS);
         EXPECT_THAT(gate.identifiers(of), ElementsAre("A1", "A2"));
         const ObjectPath path = keyedPath(of, "A1");
-        EXPECT_EQ(valueIn(gate.got(path), property), "ACME");
+        EXPECT_EQ(valueIn(gate.instanceOf(path), property), "ACME");
         expectStatus(gate.modify(path, {named(property, text("Other"))}), CMPI_RC_OK);
-        EXPECT_EQ(valueIn(gate.got(path), property), "Other");
-        expectStatus(gate.modify(path, gate.got(path).properties), CMPI_RC_OK);
+        EXPECT_EQ(valueIn(gate.instanceOf(path), property), "Other");
+        expectStatus(gate.modify(path, gate.instanceOf(path).properties), CMPI_RC_OK);
         expectStatus(gate.modify(path, {named("ElementName", text("x"))}), CMPI_RC_ERR_INVALID_PARAMETER);
         expectStatus(gate.remove("A1", of), CMPI_RC_OK);
         EXPECT_THAT(gate.identifiers(of), ElementsAre("A2"));
@@ -50,7 +50,7 @@ TEST_P(ManagerTest, LeasesAndWarrantiesAreCreatedReadChangedAndDeleted) {
     }
 }
 
-TEST_P(ManagerTest, StaysWithItsTablesWhileIdle) {
+TEST_P(ManagerTest, StaysLoadedWhileIdle) {
     expectStatus(gate.create("A1", {named("Lessor", text("ACME"))}), CMPI_RC_OK);
     testsupport::writeFile(agentEnvironment::dataDirectory() / "Lease.dat", "");
     gate.manager().idle();
@@ -68,7 +68,7 @@ TEST_P(ManagerTest, ARecordWithoutIdentifierIsNotCreated) {
 TEST_P(ManagerTest, TheAgentIsReadAndCannotBeChanged) {
     const auto paths = gate.paths(agent);
     ASSERT_THAT(paths, SizeIs(1));
-    EXPECT_EQ(valueIn(gate.got(paths.front()), "Version"), "4.2.0");
+    EXPECT_EQ(valueIn(gate.instanceOf(paths.front()), "Version"), "4.2.0");
     EXPECT_THAT(gate.manager().perform(Request::enumerateInstances(classPath(agent))).instances, SizeIs(1));
     expectStatus(gate.modify(paths.front(), {}), CMPI_RC_ERR_NOT_SUPPORTED);
 }
@@ -77,43 +77,43 @@ TEST_P(ManagerTest, AssetDataAreReadAndChanged) {
     const auto paths = gate.paths(asset);
     ASSERT_THAT(paths, SizeIs(2)) << "one a computer";
     expectStatus(gate.modify(paths.front(), {named("PersonalizedData2", text("second"))}), CMPI_RC_OK);
-    std::vector<NamedValue> sent = gate.got(paths.front()).properties;
+    std::vector<NamedValue> sent = gate.instanceOf(paths.front()).properties;
     for (NamedValue& property : sent) {
         property = property.name == "AssetNumber" ? named("AssetNumber", text("A 1")) : property;
     }
     expectStatus(gate.modify(paths.front(), sent), CMPI_RC_OK);
-    const Instance changed = gate.got(paths.front());
+    const Instance changed = gate.instanceOf(paths.front());
     EXPECT_EQ(valueIn(changed, "AssetNumber"), "A 1");
     EXPECT_EQ(valueIn(changed, "PersonalizedData2"), "second");
     EXPECT_EQ(valueIn(changed, "PersonalizedData3"), "Null");
 }
 
-TEST_P(ManagerTest, AssociationsTellTheSameFromAllSides) {
-    expectStatus(gate.create(firstPlace, {}), CMPI_RC_OK);
-    expectStatus(gate.create(secondPlace, {}), CMPI_RC_OK);
-    expectStatus(gate.create(secondPlace, {}, warranty), CMPI_RC_OK);
+TEST_P(ManagerTest, AssociationsAgreeInBothDirections) {
+    expectStatus(gate.create(firstNode, {}), CMPI_RC_OK);
+    expectStatus(gate.create(secondNode, {}), CMPI_RC_OK);
+    expectStatus(gate.create(secondNode, {}, warranty), CMPI_RC_OK);
     const auto leases = gate.paths(leaseSetting);
     ASSERT_THAT(leases, SizeIs(2));
     EXPECT_THAT(gate.paths(warrantySetting), SizeIs(1));
     EXPECT_THAT(gate.manager().perform(Request::enumerateInstances(classPath(leaseSetting))).instances, SizeIs(2));
-    EXPECT_THAT(gate.got(leases.front()).properties, SizeIs(2));
+    EXPECT_THAT(gate.instanceOf(leases.front()).properties, SizeIs(2));
     const cimhost::AssociationFilter byLease{leaseSetting, {}, {}, {}};
     const cimhost::AssociationFilter resultLease{{}, leaseSetting, {}, {}};
     const ObjectPath beta = computerPath("beta");
     EXPECT_THAT(identifiersOf(gate.manager().perform(Request::associatorNames(beta, byLease)).paths),
-                ElementsAre(secondPlace));
+                ElementsAre(secondNode));
     EXPECT_THAT(gate.manager().perform(Request::associators(beta, byLease)).instances, SizeIs(1));
     EXPECT_THAT(gate.manager().perform(Request::references(beta, resultLease)).instances, SizeIs(1));
     EXPECT_THAT(gate.manager().perform(Request::referenceNames(beta, resultLease)).paths, SizeIs(1));
-    const ObjectPath element = keyedPath(lease, secondPlace);
-    EXPECT_THAT(shownPaths(gate.manager().perform(Request::associatorNames(element, byLease)).paths),
+    const ObjectPath element = keyedPath(lease, secondNode);
+    EXPECT_THAT(formattedPaths(gate.manager().perform(Request::associatorNames(element, byLease)).paths),
                 ElementsAre("root/cimv2:VELKO_ComputerSystem.Name=\"beta\""));
     EXPECT_THAT(gate.manager().perform(Request::associators(element, byLease)).instances, SizeIs(1));
     EXPECT_THAT(gate.manager().perform(Request::references(element, resultLease)).instances, SizeIs(1));
     EXPECT_THAT(gate.manager().perform(Request::referenceNames(element, resultLease)).paths, SizeIs(1));
 }
 
-TEST_P(ManagerTest, WhatTheDataFileWouldLoseIsRefused) {
+TEST_P(ManagerTest, LossyValuesAreRefused) {
     expectStatus(gate.create("A_1", {}), CMPI_RC_ERR_INVALID_PARAMETER);
     const auto status = gate.create("A1", {named("Lessor", text("ACME_Leasing"))});
     expectStatus(status, CMPI_RC_ERR_INVALID_PARAMETER);

@@ -11,11 +11,11 @@
 
 #include "support/UnderTest.h"
 
-// Memory that runs out anywhere on the way through the gate.
+// Each allocation of the gate fails in turn.
 
 namespace {
 
-/** Which allocation of the gate on this thread fails, counted from now; 0 for none. */
+/** Number of the gate's allocation on this thread that fails, counted from now; 0 for none. */
 thread_local long failingAllocation = 0;
 
 bool isIn(const void* address, const char* library) {
@@ -24,8 +24,8 @@ bool isIn(const void* address, const char* library) {
 }
 
 /**
- * Whether the gate itself allocates, if only by way of the standard library. What the provider does when its memory
- * runs out is its own matter.
+ * Returns whether the gate allocates, also through the standard library. Allocations of the provider are not tested
+ * here.
  */
 bool isTheGate(void* caller) {
     void* frames[24];
@@ -52,7 +52,7 @@ void* allocateOrThrow(std::size_t size, void* caller) {
 
 }  // namespace
 
-// In the place of the standard library's, also for the libraries under test.
+// Replaces the standard library's operators, also for the libraries under test.
 void* operator new(std::size_t size) {
     return allocateOrThrow(size, __builtin_return_address(0));
 }
@@ -83,7 +83,7 @@ namespace {
 
 using testing::ElementsAre;
 
-/** What an entry point is given, made while there is memory. */
+/** Arguments of an entry point, created before allocations fail. */
 struct Arguments {
     CMPIInstanceMI* instances;
     CMPIAssociationMI* associations;
@@ -161,9 +161,9 @@ const EntryPoint entryPoints[] = {
 
 class MemoryTest : public GateTest, public testing::WithParamInterface<EntryPoint> {
 protected:
-    /** Calls the entry point while one allocation fails. @return whether there was that allocation */
+    /** Calls the entry point while one allocation fails. @return whether the allocation occurred */
     bool run(long number, Outcome& outcome) {
-        const ObjectPath path = keyedPath(GetParam().pathsClass, firstPlace);
+        const ObjectPath path = keyedPath(GetParam().pathsClass, firstNode);
         const Instance sent = testsupport::instance(
             path, {named(GetParam().pathsClass == warranty ? "Warrantor" : "Lessor", text("Other"))});
         bool hasFailed = false;
@@ -181,23 +181,23 @@ protected:
     }
 };
 
-TEST_P(MemoryTest, WhateverAllocationFailsNothingIsThrownAndTheNextRequestIsServed) {
+TEST_P(MemoryTest, NoAllocationFailureThrowsOrBreaksTheNextRequest) {
     create("bystander", {named("Lessor", text("First"))});
-    create(firstPlace, {named("Lessor", text("ACME"))});
+    create(firstNode, {named("Lessor", text("ACME"))});
     bool goesOn = true;
     for (long number = 1; goesOn && !HasFailure(); ++number) {
         if (GetParam().pathsClass == warranty) {
-            gate().deleteInstance(keyedPath(warranty, firstPlace));
+            gate().deleteInstance(keyedPath(warranty, firstNode));
         }
         if (std::string(GetParam().name) == "deleteInstance") {
-            create(firstPlace, {}, warranty);
+            create(firstNode, {}, warranty);
         }
         Outcome outcome;
         goesOn = run(number, outcome);
         EXPECT_FALSE(outcome.threw) << "allocation " << number;
         EXPECT_EQ(outcome.message.empty(), outcome.rc == CMPI_RC_OK) << "allocation " << number;
-        EXPECT_THAT(identifiers(), ElementsAre("bystander", firstPlace)) << "allocation " << number;
-        EXPECT_EQ(valueIn(got("bystander"), "Lessor"), "First");
+        EXPECT_THAT(identifiers(), ElementsAre("bystander", firstNode)) << "allocation " << number;
+        EXPECT_EQ(valueIn(instanceOf("bystander"), "Lessor"), "First");
         if (std::string(GetParam().name) == "createInstance") {
             EXPECT_EQ(identifiers(warranty).empty(), outcome.rc != CMPI_RC_OK) << "allocation " << number;
         }
@@ -207,7 +207,7 @@ TEST_P(MemoryTest, WhateverAllocationFailsNothingIsThrownAndTheNextRequestIsServ
 INSTANTIATE_TEST_SUITE_P(Gate, MemoryTest, testing::ValuesIn(entryPoints),
                          [](const auto& parameter) { return std::string(parameter.param.name); });
 
-TEST(FactoryMemoryTest, WhateverAllocationFailsNothingIsThrown) {
+TEST(FactoryMemoryTest, NoAllocationFailureThrows) {
     bool goesOn = true;
     for (long number = 1; goesOn; ++number) {
         testsupport::RecordingBroker broker;

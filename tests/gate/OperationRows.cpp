@@ -1,6 +1,6 @@
 #include "OperationRows.h"
 
-#include "Shown.h"
+#include "Formatting.h"
 
 namespace gatetest {
 
@@ -12,23 +12,26 @@ using cimhost::lab::Manager;
 using Rows = std::vector<Row>;
 using Values = std::vector<NamedValue>;
 
-/** Where managers make nothing of their own of what the provider answers. */
-Bare always(const std::string& answer) {
+/** The same response under each manager. */
+BareResponse always(const std::string& answer) {
     return {answer, answer, answer, answer};
 }
 
-/** A creation that the provider answers with the instance: taken, misread, or without a key to go by. */
-Bare creation(const std::string& path, const std::string& stored, const std::string& storedWithoutKey) {
+/**
+ * A creation to which the provider responds with the instance. One manager returns its path, one misreads it, and one
+ * fails because the instance has no usable path.
+ */
+BareResponse creation(const std::string& path, const std::string& stored, const std::string& storedWithoutKey) {
     return {path + stored, "root/cimv2[]" + stored, "manager's error 1", "manager's error 1" + storedWithoutKey};
 }
 
-/** One that it accepts and does not answer; where all it sees is an empty key, it makes a record of that. */
-Bare silentCreation(const std::string& storedWithoutKey) {
+/** A creation that succeeds without a result. A manager that passes an empty key stores a record with it. */
+BareResponse silentCreation(const std::string& storedWithoutKey) {
     return {"manager's error 1", "died", "manager's error 1", "manager's error 1" + storedWithoutKey};
 }
 
-/** Where only the reading of references tells managers apart: one makes none of what is not supported. */
-Bare unsupportedReferences() {
+/** Unsupported requests for references: some managers return an empty success instead of the error. */
+BareResponse unsupportedReferences() {
     return {"error 7", "error 7", "", ""};
 }
 
@@ -64,12 +67,12 @@ Request queried(const std::string& className) {
     return request;
 }
 
-/** A class of records, as the rows see it. */
+/** A class of records. */
 struct RecordKind {
     const char* className;
     const char* otherClass;
     const char* setting;
-    const char* property;  ///< a text that can be changed, the first of the data file
+    const char* property;  ///< a writable string property, the first in the data file
     const char* file;
 };
 
@@ -81,11 +84,11 @@ ObjectPath recordPath(const RecordKind& kind, const std::string& id) {
 }
 
 std::string allRecords(const RecordKind& kind) {
-    return shown(recordPath(kind, firstPlace)) + " " + shown(recordPath(kind, "L")) + " " +
-           shown(recordPath(kind, secondPlace));
+    return formatted(recordPath(kind, firstNode)) + " " + formatted(recordPath(kind, "L")) + " " +
+           formatted(recordPath(kind, secondNode));
 }
 
-/** That the file has changed and has these records now. */
+/** Formats the change of a record file to these records. */
 std::string fileHas(const RecordKind& kind, const std::vector<std::string>& records) {
     std::string text = std::string("; ") + kind.file + ":";
     for (const std::string& each : records) {
@@ -96,12 +99,12 @@ std::string fileHas(const RecordKind& kind, const std::vector<std::string>& reco
 
 Rows readingRecords(const RecordKind& kind) {
     const ObjectPath all = classPath(kind.className);
-    const std::string first = shown(recordPath(kind, firstPlace));
+    const std::string first = formatted(recordPath(kind, firstNode));
     return {
         {"enumerate", asked(Operation::enumerateInstances, all), allRecords(kind), always(allRecords(kind))},
         {"names", asked(Operation::enumerateInstanceNames, all), allRecords(kind), always(allRecords(kind))},
-        {"get", asked(Operation::getInstance, recordPath(kind, "L")), shown(recordPath(kind, "L")),
-         always(shown(recordPath(kind, "L")))},
+        {"get", asked(Operation::getInstance, recordPath(kind, "L")), formatted(recordPath(kind, "L")),
+         always(formatted(recordPath(kind, "L")))},
         {"get absent", asked(Operation::getInstance, recordPath(kind, "none")), "error 6", always("manager's error 6")},
         {"get without key", asked(Operation::getInstance, all), "error 4", always(first)},
         {"query", queried(kind.className), "error 7", always("error 7")},
@@ -110,40 +113,41 @@ Rows readingRecords(const RecordKind& kind) {
 
 Rows creatingRecords(const RecordKind& kind) {
     const ObjectPath fresh = recordPath(kind, "N");
-    const std::string stored = fileHas(kind, {firstPlace, "L", secondPlace, "N"});
-    const std::string withoutKey = fileHas(kind, {firstPlace, "L", secondPlace, "(empty)"});
-    const Bare made = creation(shown(fresh), stored, withoutKey);
+    const std::string stored = fileHas(kind, {firstNode, "L", secondNode, "N"});
+    const std::string withoutKey = fileHas(kind, {firstNode, "L", secondNode, "(empty)"});
+    const BareResponse made = creation(formatted(fresh), stored, withoutKey);
     const ObjectPath lossy = recordPath(kind, "N_1");
-    const std::string lost = fileHas(kind, {firstPlace, "L", secondPlace, "N 1"});
+    const std::string lost = fileHas(kind, {firstNode, "L", secondNode, "N 1"});
     return {
-        {"create", created(fresh), shown(fresh) + stored, made},
+        {"create", created(fresh), formatted(fresh) + stored, made},
         {"create with value", created(fresh, {named(kind.property, text("ACME"))}),
-         shown(fresh) + fileHas(kind, {firstPlace, "L", secondPlace, "N(ACME)"}), made},
-        {"create what is there", created(recordPath(kind, "L")), "error 11", silentCreation(withoutKey)},
+         formatted(fresh) + fileHas(kind, {firstNode, "L", secondNode, "N(ACME)"}), made},
+        {"create existing", created(recordPath(kind, "L")), "error 11", silentCreation(withoutKey)},
         {"create without key", created(classPath(kind.className)), "error 4", silentCreation(withoutKey)},
         {"create with read-only value", created(fresh, {named("ElementName", text("x"))}), "error 4", made},
-        {"create what would be lost", created(lossy), "error 4", creation(shown(lossy), lost, withoutKey)},
+        {"create with lossy value", created(lossy), "error 4", creation(formatted(lossy), lost, withoutKey)},
     };
 }
 
 Rows modifyingRecords(const RecordKind& kind) {
-    const ObjectPath there = recordPath(kind, "L");
+    const ObjectPath existing = recordPath(kind, "L");
     const Values change{named(kind.property, text("New"))};
-    const std::string stored = fileHas(kind, {firstPlace, "L(New)", secondPlace});
-    const std::string firstChanged = fileHas(kind, {std::string(firstPlace) + "(New)", "L", secondPlace});
+    const std::string stored = fileHas(kind, {firstNode, "L(New)", secondNode});
+    const std::string firstChanged = fileHas(kind, {std::string(firstNode) + "(New)", "L", secondNode});
     return {
-        {"modify", modified(there, change), stored, always(stored)},
-        {"modify what is listed", modified(there, change, {{kind.property}}), stored, always(stored)},
-        {"modify what is not listed", modified(there, change, {{"ElementName"}}), "", always(stored)},
-        {"modify to null", modified(there, {named(kind.property, testsupport::nullOf(CMPI_string))}), "", always("")},
+        {"modify", modified(existing, change), stored, always(stored)},
+        {"modify listed property", modified(existing, change, {{kind.property}}), stored, always(stored)},
+        {"modify unlisted property", modified(existing, change, {{"ElementName"}}), "", always(stored)},
+        {"modify to null", modified(existing, {named(kind.property, testsupport::nullOf(CMPI_string))}), "",
+         always("")},
         {"modify absent", modified(recordPath(kind, "none"), change), "error 6", always("")},
         {"modify without key", modified(classPath(kind.className), change), "error 4", always(firstChanged)},
-        {"modify read-only", modified(there, {named("ElementName", text("x"))}), "error 4", always("")},
+        {"modify read-only", modified(existing, {named("ElementName", text("x"))}), "error 4", always("")},
     };
 }
 
 Rows deletingRecords(const RecordKind& kind) {
-    const std::string stored = fileHas(kind, {firstPlace, secondPlace});
+    const std::string stored = fileHas(kind, {firstNode, secondNode});
     return {
         {"delete", asked(Operation::deleteInstance, recordPath(kind, "L")), stored, always(stored)},
         {"delete absent", asked(Operation::deleteInstance, recordPath(kind, "none")), "error 6", always("")},
@@ -151,7 +155,7 @@ Rows deletingRecords(const RecordKind& kind) {
     };
 }
 
-/** The path of a class that describes a product, with the agent's version. */
+/** Returns the path of a product's instance with the agent's version. */
 ObjectPath assetPath(const std::string& computer) {
     return testsupport::objectPath(nameSpace, asset,
                                    {named("IdentifyingNumber", text("/system")), named("Name", text(computer)),
@@ -165,30 +169,30 @@ ObjectPath agentPath(const std::string& version) {
          named("ProductName", text("Test Agent")), named("Vendor", text("VEL")), named("Version", text(version))});
 }
 
-Rows readingProducts(const std::string& all, const ObjectPath& there, const ObjectPath& absent) {
-    const ObjectPath none = classPath(there.className);
+Rows readingProducts(const std::string& all, const ObjectPath& existing, const ObjectPath& absent) {
+    const ObjectPath none = classPath(existing.className);
     const std::string first = all.substr(0, all.find("] ") == std::string::npos ? all.size() : all.find("] ") + 1);
     return {
         {"enumerate", asked(Operation::enumerateInstances, none), all, always(all)},
         {"names", asked(Operation::enumerateInstanceNames, none), all, always(all)},
-        {"get", asked(Operation::getInstance, there), shown(there), always(shown(there))},
+        {"get", asked(Operation::getInstance, existing), formatted(existing), always(formatted(existing))},
         {"get absent", asked(Operation::getInstance, absent), "error 6", always("manager's error 6")},
         {"get without key", asked(Operation::getInstance, none), "error 4", always(first)},
         {"create", created(absent), "error 7", always("error 5")},
-        {"delete", asked(Operation::deleteInstance, there), "error 7", always("error 5")},
-        {"query", queried(there.className), "error 7", always("error 7")},
+        {"delete", asked(Operation::deleteInstance, existing), "error 7", always("error 5")},
+        {"query", queried(existing.className), "error 7", always("error 7")},
     };
 }
 
 Rows modifyingProducts() {
     const Values number{named("AssetNumber", text("A 1"))};
-    const ObjectPath there = assetPath("alpha");
+    const ObjectPath existing = assetPath("alpha");
     const ObjectPath absent = assetPath("gamma");
     return {
-        {"modify", modified(there, number), "; asset.dat", always("; asset.dat")},
+        {"modify", modified(existing, number), "; asset.dat", always("; asset.dat")},
         {"modify absent", modified(absent, number), "error 6", always("; asset.dat")},
         {"modify without key", modified(classPath(asset), number), "error 4", always("; asset.dat")},
-        {"modify read-only", modified(there, {named("CSName", text("x"))}), "error 4", always("; asset.dat")},
+        {"modify read-only", modified(existing, {named("CSName", text("x"))}), "error 4", always("; asset.dat")},
         {"modify agent", modified(agentPath("4.2.0"), {named("Status", text("x"))}), "error 7", always("error 5")},
     };
 }
@@ -201,26 +205,29 @@ ObjectPath settingPath(const RecordKind& kind, const std::string& computer, cons
 
 Rows settings(const RecordKind& kind) {
     const ObjectPath all = classPath(kind.setting);
-    const ObjectPath there = settingPath(kind, "beta", secondPlace);
-    const ObjectPath absent = settingPath(kind, "beta", firstPlace);
-    const std::string both = shown(settingPath(kind, "alpha", firstPlace)) + " " + shown(there);
-    const std::string pairs = shown(settingPath(kind, "alpha", firstPlace)) + " " +
-                              shown(settingPath(kind, "alpha", "L")) + " " +
-                              shown(settingPath(kind, "alpha", secondPlace));
+    const ObjectPath existing = settingPath(kind, "beta", secondNode);
+    const ObjectPath absent = settingPath(kind, "beta", firstNode);
+    const std::string both = formatted(settingPath(kind, "alpha", firstNode)) + " " + formatted(existing);
+    const std::string pairs = formatted(settingPath(kind, "alpha", firstNode)) + " " +
+                              formatted(settingPath(kind, "alpha", "L")) + " " +
+                              formatted(settingPath(kind, "alpha", secondNode));
     return {
         {"enumerate", asked(Operation::enumerateInstances, all), both, always(pairs)},
         {"names", asked(Operation::enumerateInstanceNames, all), both, always(pairs)},
-        {"get", asked(Operation::getInstance, there), shown(there), always("error 7")},
+        {"get", asked(Operation::getInstance, existing), formatted(existing), always("error 7")},
         {"get absent", asked(Operation::getInstance, absent), "error 6", always("error 7")},
         {"get without key", asked(Operation::getInstance, all), "error 4", always("error 7")},
         {"create", created(absent), "error 7", always("error 5")},
-        {"modify", modified(there, {}), "error 7", always("error 5")},
-        {"delete", asked(Operation::deleteInstance, there), "error 7", always("error 5")},
+        {"modify", modified(existing, {}), "error 7", always("error 5")},
+        {"delete", asked(Operation::deleteInstance, existing), "error 7", always("error 5")},
         {"query", queried(kind.setting), "error 7", always("error 7")},
     };
 }
 
-/** What belongs to an instance: the far ends, the associations, and the far ends as the provider tells them. */
+/**
+ * A source instance with its expected associated objects, associations, and associated objects from the bare
+ * provider.
+ */
 struct Ends {
     const char* name;
     ObjectPath source;
@@ -230,20 +237,22 @@ struct Ends {
 };
 
 std::vector<Ends> endsOf(const RecordKind& kind) {
-    const std::string alpha = shown(computerPath("alpha"));
-    const std::string beta = shown(computerPath("beta"));
-    const auto setting = [&](const char* computer, const char* id) { return shown(settingPath(kind, computer, id)); };
+    const std::string alpha = formatted(computerPath("alpha"));
+    const std::string beta = formatted(computerPath("beta"));
+    const auto setting = [&](const char* computer, const char* id) {
+        return formatted(settingPath(kind, computer, id));
+    };
     return {
-        {"first computer", computerPath("alpha"), shown(recordPath(kind, firstPlace)), setting("alpha", firstPlace),
-         shown(recordPath(kind, firstPlace))},
-        {"second computer", computerPath("beta"), shown(recordPath(kind, secondPlace)), setting("beta", secondPlace),
-         shown(recordPath(kind, secondPlace))},
+        {"first computer", computerPath("alpha"), formatted(recordPath(kind, firstNode)), setting("alpha", firstNode),
+         formatted(recordPath(kind, firstNode))},
+        {"second computer", computerPath("beta"), formatted(recordPath(kind, secondNode)), setting("beta", secondNode),
+         formatted(recordPath(kind, secondNode))},
         {"absent computer", computerPath("gamma"), "", "", ""},
-        {"first record", recordPath(kind, firstPlace), alpha, setting("alpha", firstPlace), alpha},
-        {"second record", recordPath(kind, secondPlace), beta, setting("beta", secondPlace), alpha},
-        {"record of nobody", recordPath(kind, "L"), "", "", ""},
+        {"first record", recordPath(kind, firstNode), alpha, setting("alpha", firstNode), alpha},
+        {"second record", recordPath(kind, secondNode), beta, setting("beta", secondNode), alpha},
+        {"record without computer", recordPath(kind, "L"), "", "", ""},
         {"absent record", recordPath(kind, "none"), "", "", ""},
-        {"other class", keyedPath(kind.otherClass, firstPlace), "", "", ""},
+        {"other class", keyedPath(kind.otherClass, firstNode), "", "", ""},
     };
 }
 
@@ -265,12 +274,12 @@ Rows associations(const RecordKind& kind) {
     return rows;
 }
 
-/** Roles and classes, from the first computer; the provider takes no notice of them. */
+/** Filters by role and class, from the first computer; the bare provider ignores them. */
 Rows filters(const RecordKind& kind) {
     struct Filter {
         const char* name;
-        cimhost::AssociationFilter filter;  ///< beside the association class
-        bool lets;
+        cimhost::AssociationFilter filter;  ///< without the association class
+        bool matches;
     };
     const Filter all[] = {
         {"own role", {{}, {}, "Antecedent", {}}, true},
@@ -283,34 +292,38 @@ Rows filters(const RecordKind& kind) {
         {"other result class", {{}, kind.otherClass, {}, {}}, false},
         {"empty filters", {{}, "", "", ""}, true},
     };
-    const std::string found = shown(recordPath(kind, firstPlace));
+    const std::string found = formatted(recordPath(kind, firstNode));
     Rows rows;
     for (Filter each : all) {
         each.filter.associationClass = kind.setting;
         for (const Operation operation : {Operation::associators, Operation::associatorNames}) {
             rows.push_back({std::string(each.name) + " of " + cimhost::nameOf(operation),
-                            asked(operation, computerPath("alpha"), each.filter), each.lets ? found : "",
+                            asked(operation, computerPath("alpha"), each.filter), each.matches ? found : "",
                             always(found)});
         }
     }
-    const std::string association = shown(settingPath(kind, "alpha", firstPlace));
+    const std::string association = formatted(settingPath(kind, "alpha", firstNode));
     for (const Operation operation : {Operation::references, Operation::referenceNames}) {
-        for (const auto& [role, lets] : {std::pair("Antecedent", true), std::pair("Dependent", false)}) {
+        for (const auto& [role, matches] : {std::pair("Antecedent", true), std::pair("Dependent", false)}) {
             rows.push_back({std::string("role ") + role + " of " + cimhost::nameOf(operation),
                             asked(operation, computerPath("alpha"), {{}, kind.setting, role, {}}),
-                            lets ? association : "", unsupportedReferences()});
+                            matches ? association : "", unsupportedReferences()});
         }
     }
     return rows;
 }
 
-/** No association class: all of them. A manager that passes that on gets the provider's refusal. */
+/**
+ * Requests without an association class select all of them. A manager that passes them on returns the provider's
+ * error.
+ */
 Rows anyAssociation() {
-    const std::string records = shown(keyedPath(lease, firstPlace)) + " " + shown(keyedPath(warranty, firstPlace));
-    const std::string both = shown(settingPath(recordKinds[0], "alpha", firstPlace)) + " " +
-                             shown(settingPath(recordKinds[1], "alpha", firstPlace));
+    const std::string records =
+        formatted(keyedPath(lease, firstNode)) + " " + formatted(keyedPath(warranty, firstNode));
+    const std::string both = formatted(settingPath(recordKinds[0], "alpha", firstNode)) + " " +
+                             formatted(settingPath(recordKinds[1], "alpha", firstNode));
     const ObjectPath computer = computerPath("alpha");
-    const Bare found{records, "error 5", records, records};
+    const BareResponse found{records, "error 5", records, records};
     return {
         {"associators", asked(Operation::associators, computer), records, found},
         {"associator names", asked(Operation::associatorNames, computer), records, found},
@@ -328,7 +341,7 @@ void append(Rows& rows, const std::string& about, Rows more) {
 
 }  // namespace
 
-const std::string& Bare::under(Manager manager) const {
+const std::string& BareResponse::under(Manager manager) const {
     switch (manager) {
         case Manager::standard:
             return standard;
@@ -342,7 +355,7 @@ const std::string& Bare::under(Manager manager) const {
 }
 
 std::vector<std::string> recordsOfRows() {
-    return {firstPlace, "L", secondPlace};
+    return {firstNode, "L", secondNode};
 }
 
 std::vector<Row> operationRows() {
@@ -355,9 +368,9 @@ std::vector<Row> operationRows() {
             append(rows, kind.setting, some(kind));
         }
     }
-    const std::string both = shown(assetPath("alpha")) + " " + shown(assetPath("beta"));
+    const std::string both = formatted(assetPath("alpha")) + " " + formatted(assetPath("beta"));
     append(rows, asset, readingProducts(both, assetPath("beta"), assetPath("gamma")));
-    append(rows, agent, readingProducts(shown(agentPath("4.2.0")), agentPath("4.2.0"), agentPath("1.0")));
+    append(rows, agent, readingProducts(formatted(agentPath("4.2.0")), agentPath("4.2.0"), agentPath("1.0")));
     append(rows, "products", modifyingProducts());
     append(rows, "any association", anyAssociation());
     return rows;

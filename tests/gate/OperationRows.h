@@ -7,35 +7,35 @@
 #include "lab/emulation/ManagerEmulation.h"
 #include "model/Request.h"
 
-// Every operation of every class: requests, and what is answered to them.
+// Every operation of every class, with its expected responses.
 
 namespace gatetest {
 
-/** What the provider's own answer to a request becomes under each object manager. */
-struct Bare {
+/** The client's response to a request of the bare provider, per object manager. */
+struct BareResponse {
     std::string standard;
     std::string sfcb;
     std::string pegasus;
-    std::string emptyKey;  ///< under the manager whose new instances have an empty key in their path
+    std::string emptyKey;  ///< for the manager that passes new instances with an empty key in their path
 
     const std::string& under(cimhost::lab::Manager manager) const;
 };
 
 /**
- * A request, and what is answered to it where the records firstPlace, "L" and secondPlace are there, leases as well as
- * warranties. Answers are texts as in Shown.h, with the changes of the data files.
+ * A request and its expected responses. The records firstNode, "L" and secondNode exist, as leases and as
+ * warranties. Responses have the format of Formatting.h, with the changes of the data files.
  */
 struct Row {
     std::string name;
     cimhost::Request request;
-    std::string gate;  ///< whatever the object manager
-    Bare bare;
+    std::string gate;  ///< under every object manager
+    BareResponse bare;
 };
 
-/** Identifiers of the records that the rows expect. */
+/** Returns the identifiers of the records that the rows require. */
 std::vector<std::string> recordsOfRows();
 
-/** All rows. */
+/** Returns all rows. */
 std::vector<Row> operationRows();
 
 }  // namespace gatetest

@@ -1,9 +1,9 @@
+#include "Formatting.h"
 #include "ManagedGate.h"
 #include "OperationRows.h"
-#include "Shown.h"
 #include "lab/emulation/ManagerEmulation.h"
 
-// Every operation of every class under every object manager: through the gate, and from the provider itself.
+// Every operation of every class under every object manager, through the gate and with the bare provider.
 
 namespace gatetest {
 namespace {
@@ -18,22 +18,22 @@ protected:
     OperationTest() { agentEnvironment::clear(); }
     ~OperationTest() override { agentEnvironment::clear(); }
 
-    /** The library that serves the classes is loaded again for each request, over the same files. */
+    /** Sends the request to a newly loaded library with the same initial files. */
     cimhost::Response ask(const Row& row, Served served) {
         agentEnvironment::clear();
         writeRecords(recordsOfRows());
         const DataFiles before;
         ManagedGate gate(GetParam(), served);
         cimhost::Response response = gate.manager().perform(row.request);
-        got = shown(response) + before.changes();
+        received = formatted(response) + before.changes();
         return response;
     }
 
-    std::string got;  ///< what the client got, and what became of the files
+    std::string received;  ///< response of the client and changes of the files
     SilentLog silence;
 };
 
-/** The rows that are this manager's: all of them, or its share, so that each is some manager's. */
+/** Returns the rows for a manager: all, or its share, so that each row is tested with one manager. */
 std::vector<Row> rowsOf(Manager manager) {
     const std::vector<Row> all = operationRows();
     std::vector<Row> rows;
@@ -43,7 +43,7 @@ std::vector<Row> rowsOf(Manager manager) {
     return rows;
 }
 
-/** A failure has a message of the provider's own and no answers; whatever else, none. */
+/** Expects that a failure has a message and no results, and that a success has no message. */
 void expectStandardForm(const ProviderResponse& answer) {
     EXPECT_FALSE(answer.threw);
     if (answer.status.ok()) {
@@ -54,11 +54,11 @@ void expectStandardForm(const ProviderResponse& answer) {
     }
 }
 
-TEST_P(OperationTest, ThroughTheGateEveryOperationIsAnsweredAsTheStandardPromises) {
+TEST_P(OperationTest, TheGateFollowsTheStandard) {
     for (const Row& row : rowsOf(GetParam())) {
         SCOPED_TRACE(row.name);
         const cimhost::Response response = ask(row, Served::byGate);
-        EXPECT_EQ(got, row.gate);
+        EXPECT_EQ(received, row.gate);
         EXPECT_THAT(response.providers, Not(IsEmpty()));
         for (const ProviderResponse& answer : response.providers) {
             expectStandardForm(answer);
@@ -66,11 +66,11 @@ TEST_P(OperationTest, ThroughTheGateEveryOperationIsAnsweredAsTheStandardPromise
     }
 }
 
-TEST_P(OperationTest, TheProviderItselfAnswersAsItAlwaysDid) {
+TEST_P(OperationTest, TheBareProviderIsUnchanged) {
     for (const Row& row : rowsOf(GetParam())) {
         SCOPED_TRACE(row.name);
         const cimhost::Response response = ask(row, Served::byProvider);
-        EXPECT_EQ(got, row.bare.under(GetParam()));
+        EXPECT_EQ(received, row.bare.under(GetParam()));
         for (const ProviderResponse& answer : response.providers) {
             EXPECT_FALSE(answer.threw);
             EXPECT_FALSE(answer.hasMessage) << answer.status.message;
@@ -78,7 +78,7 @@ TEST_P(OperationTest, TheProviderItselfAnswersAsItAlwaysDid) {
     }
 }
 
-/** Creates two leases under a manager whose paths have empty keys. @return the identifiers after the next start */
+/** Creates two leases under a manager whose paths have empty keys. @return the identifiers after a restart */
 std::vector<std::string> afterEmptyKeys(Served served) {
     agentEnvironment::clear();
     writeRecords({"A"});
@@ -91,15 +91,15 @@ std::vector<std::string> afterEmptyKeys(Served served) {
     return ManagedGate(Manager::standard, served).identifiers(lease);
 }
 
-TEST(EmptyKeyTest, ThroughTheGateTheKeyIsThatOfTheInstance) {
+TEST(EmptyKeyTest, TheGateTakesTheKeyFromTheInstance) {
     EXPECT_THAT(afterEmptyKeys(Served::byGate), testing::ElementsAre("A", "B", "C"));
     agentEnvironment::clear();
 }
 
-TEST(EmptyKeyTest, WithoutItAnEmptyIdentifierShiftsTheRecordsThatFollow) {
+TEST(EmptyKeyTest, WithoutTheGateAnEmptyIdentifierShiftsTheFollowingRecords) {
     const auto identifiers = afterEmptyKeys(Served::byProvider);
     EXPECT_THAT(identifiers, testing::Not(testing::Contains("B")));
-    EXPECT_THAT(identifiers, testing::Contains("*")) << "a line of the empty record's values is taken for its key";
+    EXPECT_THAT(identifiers, testing::Contains("*")) << "a value of the empty record is read as its key";
     agentEnvironment::clear();
 }
 

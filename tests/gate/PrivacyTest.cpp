@@ -3,7 +3,7 @@
 #include "support/Files.h"
 #include "support/FullDisk.h"
 
-// What a client is told when its request is refused is about its request, and nobody else's.
+// The message of a refused request must not contain data of other clients.
 
 namespace gatetest {
 namespace {
@@ -13,7 +13,7 @@ using testing::Not;
 using testsupport::FullDisk;
 using Outcomes = std::vector<Outcome>;
 
-/** Of the two clients, the first has stored texts with its name in them wherever a client can. */
+/** Of two clients, the first has stored strings with its name in every writable place. */
 class PrivacyTest : public GateTest {
 protected:
     static constexpr const char* first = "alice-with-a-name-of-some-length";
@@ -37,7 +37,9 @@ protected:
         return gate().modifyInstance(path, testsupport::instance(path, std::move(properties)));
     }
 
-    /** That each was refused, with words, and that these tell nothing of the first client but its lease's identifier.
+    /**
+     * Expects that each request was refused with a message, and that the messages do not contain data of the first
+     * client.
      */
     static void expectNothingOfFirst(const Outcomes& refusals) {
         for (const Outcome& refusal : refusals) {
@@ -45,14 +47,14 @@ protected:
             EXPECT_TRUE(refusal.hasMessage) << refusal.rc;
             EXPECT_NE(refusal.message, "");
             EXPECT_THAT(refusal.message, Not(HasSubstr(first)));
-            EXPECT_THAT(refusal.message, Not(HasSubstr(std::string(first).substr(1)))) << "the rest of a text";
+            EXPECT_THAT(refusal.message, Not(HasSubstr(std::string(first).substr(1)))) << "a part of the name";
         }
     }
 
     const std::string ofFirst = "lease-of-a";  ///< an identifier that the second client may know
 };
 
-TEST_F(PrivacyTest, ARefusalTellsNothingOfWhatAnotherClientHasStored) {
+TEST_F(PrivacyTest, ARefusedRequestDoesNotRevealOtherRecords) {
     const std::string mine = std::string(second) + "-lease";
     const NamedValue lossy = named("Lessor", text(std::string(second) + "_of_the_file"));
     expectNothingOfFirst({
@@ -71,7 +73,7 @@ TEST_F(PrivacyTest, ARefusalTellsNothingOfWhatAnotherClientHasStored) {
     });
 }
 
-TEST_F(PrivacyTest, NorDoesOneOfAssetData) {
+TEST_F(PrivacyTest, ARefusedChangeOfAssetDataDoesNotRevealThem) {
     expectNothingOfFirst({
         modifyAsset({named("AssetIdTag", text(second))}),
         modifyAsset({named("PurchaseDate", text("yesterday"))}),
@@ -82,20 +84,20 @@ TEST_F(PrivacyTest, NorDoesOneOfAssetData) {
     });
 }
 
-TEST_F(PrivacyTest, NorDoesOneForWantOfRoomOnTheDisk) {
+TEST_F(PrivacyTest, AFullDiskDoesNotRevealOtherRecords) {
     const std::string leases = testsupport::readFile(dataFile("Lease.dat"));
     const NamedValue large = named("Lessor", text(std::string(1000, 'x')));
     {
         const FullDisk disk(leases.size() + 10);
         expectNothingOfFirst({create(second), create(second, {large}), modify(ofFirst, {large})});
     }
-    const FullDisk disk(leases.size() / 2);  // not even what was there has room
+    const FullDisk disk(leases.size() / 2);  // too small even for the old content
     expectNothingOfFirst({modify("shared", {large}), remove("shared")});
     const FullDisk none(1);
     expectNothingOfFirst({modifyAsset({named("AssetNumber", text(second))})});
 }
 
-TEST_F(PrivacyTest, NorDoesOneForWantOfTheDataDirectory) {
+TEST_F(PrivacyTest, AMissingDataDirectoryDoesNotRevealOtherRecords) {
     std::filesystem::remove_all(agentEnvironment::dataDirectory());
     expectNothingOfFirst(
         {create(second), modify(ofFirst, {named("LeaseTerm", uint32(1))}), remove(ofFirst), remove(ofFirst, warranty)});

@@ -1,7 +1,7 @@
 #include "ManagedGate.h"
 #include "lab/emulation/ManagerEmulation.h"
 
-// Property lists under every object manager: what is listed goes out, and the keys.
+// Property lists under every object manager: responses contain the listed properties and the keys.
 
 namespace gatetest {
 namespace {
@@ -20,7 +20,7 @@ struct Row {
     Names shown;
 };
 
-/** Also a name twice, in other letters, and of no property. */
+/** Includes duplicate names, names in another letter case and unknown names. */
 std::vector<Row> rows(const ObjectPath& agentPath, const ObjectPath& assetPath) {
     const ObjectPath beta = computerPath("beta");
     const Names assetNames{"IdentifyingNumber", "Name", "Vendor", "Version", "AssetNumber"};
@@ -30,12 +30,12 @@ std::vector<Row> rows(const ObjectPath& agentPath, const ObjectPath& assetPath) 
         {Operation::enumerateInstances, classPath(lease), "", {"Lessor"}, {"InstanceID", "Lessor"}},
         {Operation::enumerateInstances, classPath(lease), "", {}, {"InstanceID"}},
         {Operation::getInstance,
-         keyedPath(lease, secondPlace),
+         keyedPath(lease, secondNode),
          "",
          {"lessor", "LESSOR", "Nothing"},
          {"InstanceID", "Lessor"}},
         {Operation::enumerateInstances, classPath(warranty), "", {"Warrantor"}, {"InstanceID", "Warrantor"}},
-        {Operation::getInstance, keyedPath(warranty, secondPlace), "", {"InstanceID"}, {"InstanceID"}},
+        {Operation::getInstance, keyedPath(warranty, secondNode), "", {"InstanceID"}, {"InstanceID"}},
         {Operation::enumerateInstances, classPath(asset), "", {"AssetNumber"}, assetNames},
         {Operation::getInstance, assetPath, "", {"AssetNumber"}, assetNames},
         {Operation::enumerateInstances, classPath(agent), "", {"BuildNumber"}, agentNames},
@@ -53,8 +53,8 @@ class PropertyListTest : public testing::TestWithParam<Manager> {
 protected:
     PropertyListTest() {
         agentEnvironment::clear();
-        EXPECT_TRUE(gate.create(secondPlace, {named("Lessor", text("ACME"))}).ok());
-        EXPECT_TRUE(gate.create(secondPlace, {named("Warrantor", text("ACME"))}, warranty).ok());
+        EXPECT_TRUE(gate.create(secondNode, {named("Lessor", text("ACME"))}).ok());
+        EXPECT_TRUE(gate.create(secondNode, {named("Warrantor", text("ACME"))}, warranty).ok());
     }
     ~PropertyListTest() override { agentEnvironment::clear(); }
 
@@ -74,7 +74,7 @@ protected:
     ManagedGate gate{GetParam()};
 };
 
-TEST_P(PropertyListTest, AnswersHaveTheListedPropertiesAndTheKeys) {
+TEST_P(PropertyListTest, ResponsesHaveTheListedPropertiesAndTheKeys) {
     for (const Row& row : rows(gate.paths(agent).at(0), gate.paths(asset).at(0))) {
         SCOPED_TRACE(std::string(cimhost::nameOf(row.operation)) + " " + testsupport::toText(row.path));
         const std::vector<Instance> found = ask(row);

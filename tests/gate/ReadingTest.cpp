@@ -2,7 +2,7 @@
 
 #include "support/Files.h"
 
-// Reading, and the one class besides leases and warranties that can be changed.
+// Reading all classes, and changing asset data.
 
 namespace gatetest {
 namespace {
@@ -17,7 +17,7 @@ using testsupport::namesOf;
 
 using ReadingTest = GateTest;
 
-TEST_F(ReadingTest, PropertyListsAreAppliedAndKeysStay) {
+TEST_F(ReadingTest, PropertyListsKeepTheKeys) {
     create("L1", {named("Lessor", text("ACME")), named("LeaseTerm", uint32(12))});
     const cimhost::PropertyList list{{"lessor", "RenewalOption", "NoSuchProperty"}};
     const auto expected = UnorderedElementsAre("InstanceID", "Lessor", "RenewalOption");
@@ -34,7 +34,7 @@ TEST_F(ReadingTest, PropertyListsAreAppliedAndKeysStay) {
     EXPECT_THAT(namesOf(keys.instances().front().properties), ElementsAre("InstanceID"));
 }
 
-TEST_F(ReadingTest, ManagersThatHideWhatIsOnlyNamedAsAKeyShowTheKeys) {
+TEST_F(ReadingTest, KeysAreReturnedEvenIfTheManagerFiltersThem) {
     create("L1");
     broker.forget();
     gate().getInstance(keyedPath(lease, "L1"), {{"Lessor"}});
@@ -43,9 +43,9 @@ TEST_F(ReadingTest, ManagersThatHideWhatIsOnlyNamedAsAKeyShowTheKeys) {
     EXPECT_THAT(filters.back().arguments, ElementsAre("{InstanceID,Lessor}", "{InstanceID}"));
 }
 
-TEST_F(ReadingTest, AListOfEveryPropertyIsAsGoodAsNone) {
+TEST_F(ReadingTest, AListOfAllPropertiesEqualsNoList) {
     create("L1", {named("Lessor", text("ACME"))});
-    const Instance whole = got("L1");
+    const Instance whole = instanceOf("L1");
     std::vector<std::string> everything{"Caption", "Description", "ConfigurationName", "ChangeableType",
                                         "BaseTermCommencementDate"};
     for (const std::string& name : namesOf(whole.properties)) {
@@ -56,14 +56,14 @@ TEST_F(ReadingTest, AListOfEveryPropertyIsAsGoodAsNone) {
     EXPECT_EQ(namesOf(listed.instances().front().properties), namesOf(whole.properties));
 }
 
-TEST_F(ReadingTest, NullPropertiesOnTheListStayNull) {
+TEST_F(ReadingTest, NullPropertiesOfTheListAreNull) {
     create("L1");
     const Outcome outcome = gate().getInstance(keyedPath(lease, "L1"), {{"BaseTermCommencementDate"}});
     ASSERT_THAT(outcome, isAnswered(1));
     EXPECT_TRUE(testsupport::isNull(outcome.instances().front().properties, "BaseTermCommencementDate"));
 }
 
-TEST_F(ReadingTest, TheAgentIsGotByAllItsKeys) {
+TEST_F(ReadingTest, TheAgentIsFoundByAllItsKeys) {
     const Outcome names = gate().enumerateInstanceNames(classPath(agent));
     ASSERT_THAT(names, isAnswered(1));
     ObjectPath path = names.paths().front();
@@ -89,13 +89,13 @@ protected:
     }
 };
 
-TEST_F(AssetTest, AChangeOfOnePropertyLeavesAllOthersAsTheyWere) {
+TEST_F(AssetTest, AChangeOfOnePropertyChangesNoOther) {
     EXPECT_THAT(change({named("PersonalizedLabel1", text("Room")), named("PersonalizedData1", text("12")),
                         named("PersonalizedLabel2", text("Floor")), named("PersonalizedData2", text("3")),
                         named("PrimaryOwnerName", text("Jo Example"))}),
                 isDone());
     const Instance before = current();
-    EXPECT_EQ(valueIn(before, "PersonalizedLabel3"), "Null") << "not the label before it";
+    EXPECT_EQ(valueIn(before, "PersonalizedLabel3"), "Null") << "not the preceding label";
     EXPECT_THAT(change({named("PersonalizedData2", text("4")), named("PrimaryOwnerPhone", text("+49 1"))}), isDone());
     const Instance after = current();
     for (const std::string& name : namesOf(after.properties)) {
@@ -109,11 +109,11 @@ TEST_F(AssetTest, AChangeOfOnePropertyLeavesAllOthersAsTheyWere) {
     }
 }
 
-TEST_F(AssetTest, AnInstanceThatComesBackAsItWasReadIsAccepted) {
+TEST_F(AssetTest, AnUnchangedInstanceIsAccepted) {
     change({named("ZOPMProfile", text("Office")), named("AssetNumber", text("A_1 _ 2"))});
     Instance sent = current();
     for (NamedValue& property : sent.properties) {
-        // Sent back some time after it was read.
+        // The instance is sent back some time after it was read.
         property =
             property.name == "LocalDateTime" ? named("LocalDateTime", dateTime("20200101120000.000000+000")) : property;
         property = property.name == "ZOPMProfile" ? named("ZOPMProfile", text("Factory")) : property;
@@ -123,7 +123,7 @@ TEST_F(AssetTest, AnInstanceThatComesBackAsItWasReadIsAccepted) {
     EXPECT_EQ(valueIn(current(), "DeploymentProfile"), "Factory");
 }
 
-TEST_F(AssetTest, APathWithoutItsKeysChangesNothing) {
+TEST_F(AssetTest, APathWithoutKeysChangesNothing) {
     ObjectPath keyless = path();
     const Instance sent = testsupport::instance(keyless, {named("AssetNumber", text("A1"))});
     while (!keyless.keys.empty()) {
@@ -133,20 +133,20 @@ TEST_F(AssetTest, APathWithoutItsKeysChangesNothing) {
     EXPECT_EQ(valueIn(current(), "AssetNumber"), "");
 }
 
-TEST_F(AssetTest, AChangeWritesNoPersonalizedTextThatNobodyGave) {
+TEST_F(AssetTest, AChangeWritesNoPersonalizedValueThatWasNotSent) {
     EXPECT_THAT(change({named("AssetNumber", text("A1"))}), isDone());
     const std::string untouched = testsupport::readFile(dataFile("asset.dat"));
     EXPECT_THAT(untouched, testing::HasSubstr("USER.AssetNumber=A1\n"));
     EXPECT_THAT(untouched, Not(testing::HasSubstr("Null")));
     EXPECT_THAT(change({named("PersonalizedLabel2", text("Room")), named("PersonalizedData4", text(""))}), isDone());
     EXPECT_THAT(testsupport::readFile(dataFile("asset.dat")), Not(testing::HasSubstr("Null")));
-    EXPECT_THAT(gate().modifyInstance(path(), current()), isDone()) << "as it was read";
+    EXPECT_THAT(gate().modifyInstance(path(), current()), isDone()) << "unchanged";
     EXPECT_THAT(testsupport::readFile(dataFile("asset.dat")), Not(testing::HasSubstr("Null")));
     EXPECT_EQ(valueIn(current(), "PersonalizedLabel2"), "Room");
     EXPECT_EQ(valueIn(current(), "PersonalizedLabel3"), "Null");
 }
 
-TEST_F(AssetTest, AReadOnlyTextThatAManagerTrimsIsAsItWas) {
+TEST_F(AssetTest, ATrimmedReadOnlyStringIsAccepted) {
     testsupport::writeFile(dataFile("asset.dat"), "USER.AssetIdTag=TAG-7 \xc3\xa9\nUSER.AssetNumber=A1 \n");
     const Instance before = current();
     for (const char* tag : {"TAG-7", "TAG-7 \xc3\xa9"}) {
@@ -159,7 +159,7 @@ TEST_F(AssetTest, AReadOnlyTextThatAManagerTrimsIsAsItWas) {
     EXPECT_THAT(change({named("AssetIdTag", text("TAG"))}), isRefused(CMPI_RC_ERR_INVALID_PARAMETER, "AssetIdTag"));
 }
 
-TEST_F(AssetTest, ADateIsTakenAwayByZeros) {
+TEST_F(AssetTest, ZerosUnsetADate) {
     EXPECT_THAT(change({named("PurchaseDate", dateTime("20240229235959.123456-480"))}), isDone());
     EXPECT_THAT(change({named("PurchaseDate", dateTime("00000000000000.000000+000"))}), isDone());
     EXPECT_EQ(valueIn(current(), "PurchaseDate"), std::nullopt);
@@ -176,7 +176,7 @@ TEST_F(AssetTest, ReadOnlyPropertiesAreRefusedByName) {
     EXPECT_EQ(valueIn(current(), "AssetNumber"), "");
 }
 
-TEST_F(AssetTest, TextsAreKeptAsTheyAreAndCanBeEmptied) {
+TEST_F(AssetTest, StringsAreStoredExactlyAndCanBeEmptied) {
     const std::string odd = " a_b\n* ";
     EXPECT_THAT(change({named("AssetNumber", text(odd)), named("PersonalizedData1", text("x"))}), isDone());
     unload();
@@ -186,7 +186,7 @@ TEST_F(AssetTest, TextsAreKeptAsTheyAreAndCanBeEmptied) {
     EXPECT_EQ(valueIn(current(), "PersonalizedData1"), "Null");
 }
 
-TEST_F(AssetTest, OnlyDatesThatAreDatesAreTaken) {
+TEST_F(AssetTest, OnlyValidDatesAreAccepted) {
     EXPECT_THAT(change({named("PurchaseDate", dateTime("20260229000000.000000+000"))}),
                 isRefused(CMPI_RC_ERR_INVALID_PARAMETER, "PurchaseDate"));
     EXPECT_THAT(change({named("PurchaseDate", dateTime("00000001000000.000000:000"))}),

@@ -18,7 +18,7 @@ using testsupport::nullOf;
 
 using RecordTest = GateTest;
 
-/** Every property of a lease null, as managers fill in what a client does not send. */
+/** Returns null for every property of a lease, as managers send it for properties that a client omits. */
 std::vector<NamedValue> allNull() {
     std::vector<NamedValue> properties;
     for (const char* name : {"Caption", "Description", "ElementName", "Lessor", "BaseRent", "FairMarketRental"}) {
@@ -30,15 +30,15 @@ std::vector<NamedValue> allNull() {
     return properties;
 }
 
-TEST_F(RecordTest, ACreationAnswersOnePathInTheRequestsNamespace) {
+TEST_F(RecordTest, ACreationReturnsOnePathInTheRequestsNamespace) {
     const ObjectPath path = testsupport::objectPath("root/other", lease, {named("InstanceID", text("L1"))});
     const Outcome outcome = gate().createInstance(path, testsupport::instance(path));
     EXPECT_THAT(outcome, isAnswered(1));
-    EXPECT_THAT(shownPaths(outcome.paths()), ElementsAre("root/other:VELKO_Lease.InstanceID=\"L1\""));
+    EXPECT_THAT(formattedPaths(outcome.paths()), ElementsAre("root/other:VELKO_Lease.InstanceID=\"L1\""));
     EXPECT_THAT(identifiers(), ElementsAre("L1"));
 }
 
-TEST_F(RecordTest, ANewRecordTakesItsKeyFromTheInstanceWhereThePathHasNone) {
+TEST_F(RecordTest, ANewRecordHasTheKeyOfTheInstanceIfThePathHasNone) {
     for (const auto& keys : {std::vector<NamedValue>{}, {named("InstanceID", text(""))}}) {
         const ObjectPath path = testsupport::objectPath(nameSpace, warranty, keys);
         const std::string id = "W" + std::to_string(keys.size());
@@ -62,28 +62,28 @@ TEST_F(RecordTest, ANewRecordNeedsAKey) {
     EXPECT_FALSE(std::filesystem::exists(dataFile("Lease.dat"))) << "nothing was written";
 }
 
-TEST_F(RecordTest, OfTwoKeysThatOfThePathCounts) {
+TEST_F(RecordTest, TheKeyOfThePathPrecedesThatOfTheInstance) {
     const Outcome outcome = create("L1", {named("InstanceID", text("L2")), named("Lessor", text("ACME"))});
     EXPECT_THAT(outcome, isAnswered(1));
     EXPECT_THAT(identifiersOf(outcome.paths()), ElementsAre("L1"));
     EXPECT_THAT(identifiers(), ElementsAre("L1"));
-    EXPECT_EQ(valueIn(got("L1"), "Lessor"), "ACME");
+    EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "ACME");
 }
 
-TEST_F(RecordTest, ARecordThatIsThereIsNotCreatedAgain) {
+TEST_F(RecordTest, AnExistingRecordIsNotCreatedAgain) {
     create("L1", {named("Lessor", text("ACME"))});
     EXPECT_THAT(create("L1", {named("Lessor", text("Other"))}), isRefused(CMPI_RC_ERR_ALREADY_EXISTS, "L1"));
     EXPECT_THAT(identifiers(), ElementsAre("L1"));
-    EXPECT_EQ(valueIn(got("L1"), "Lessor"), "ACME");
+    EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "ACME");
 }
 
-TEST_F(RecordTest, ValuesSentAlongAreAppliedAndNullsAreNot) {
+TEST_F(RecordTest, ACreationStoresTheValuesAndIgnoresNulls) {
     std::vector<NamedValue> properties = allNull();
     properties[3] = named("Lessor", text("ACME Leasing"));
     properties.push_back(named("FairMarketValue", text("99 EUR")));
     properties[6] = named("LeaseTerm", uint32(36));
     EXPECT_THAT(create("L1", properties), isAnswered(1));
-    const Instance created = got("L1");
+    const Instance created = instanceOf("L1");
     EXPECT_EQ(valueIn(created, "Lessor"), "ACME Leasing");
     EXPECT_EQ(valueIn(created, "LeaseTerm"), "36");
     EXPECT_EQ(valueIn(created, "FairMarketValue"), "99 EUR");
@@ -91,7 +91,7 @@ TEST_F(RecordTest, ValuesSentAlongAreAppliedAndNullsAreNot) {
     EXPECT_EQ(valueIn(created, "BaseTermCommencementDate"), std::nullopt);
 }
 
-TEST_F(RecordTest, ACreationWithAReadOnlyValueOfItsOwnMakesNoRecord) {
+TEST_F(RecordTest, ACreationWithAReadOnlyValueIsRefused) {
     EXPECT_THAT(create("L1", {named("Lessor", text("ACME")), named("Caption", text("mine"))}),
                 isRefused(CMPI_RC_ERR_INVALID_PARAMETER, "Caption"));
     EXPECT_THAT(identifiers(), IsEmpty());
@@ -99,7 +99,7 @@ TEST_F(RecordTest, ACreationWithAReadOnlyValueOfItsOwnMakesNoRecord) {
     EXPECT_THAT(create("L1", {named("ElementName", text("Lease Information"))}), isAnswered(1));
 }
 
-TEST_F(RecordTest, ARefusedCreationWritesNothingWhereAnotherRecordShowsWhatIsRight) {
+TEST_F(RecordTest, ARefusedCreationIsCheckedAgainstAnExistingRecordWithoutWriting) {
     create("L1", {named("Lessor", text("ACME"))});
     const auto written = std::filesystem::last_write_time(dataFile("Lease.dat"));
     const std::string stored = testsupport::readFile(dataFile("Lease.dat"));
@@ -114,16 +114,16 @@ TEST_F(RecordTest, ARefusedCreationWritesNothingWhereAnotherRecordShowsWhatIsRig
     EXPECT_THAT(identifiers(), ElementsAre("L1", "L2"));
 }
 
-TEST_F(RecordTest, WhatIsNotThereIsNotFound) {
+TEST_F(RecordTest, AMissingRecordIsNotFound) {
     create("L1", {named("Lessor", text("ACME"))});
     EXPECT_THAT(gate().getInstance(keyedPath(lease, "L2")), isRefused(CMPI_RC_ERR_NOT_FOUND, lease));
     EXPECT_THAT(modify("L2", {named("Lessor", text("Other"))}), isRefused(CMPI_RC_ERR_NOT_FOUND, lease));
     EXPECT_THAT(remove("L2"), isRefused(CMPI_RC_ERR_NOT_FOUND, lease));
     EXPECT_THAT(gate().getInstance(keyedPath(warranty, "L1")), isRefused(CMPI_RC_ERR_NOT_FOUND, warranty));
-    EXPECT_EQ(valueIn(got("L1"), "Lessor"), "ACME");
+    EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "ACME");
 }
 
-TEST_F(RecordTest, APathWithoutTheKeyNamesNothingAndChangesNothing) {
+TEST_F(RecordTest, APathWithoutTheKeyIsRefusedAndChangesNothing) {
     create("L1", {named("Lessor", text("ACME"))});
     const std::vector<std::vector<NamedValue>> keyLists{
         {}, {named("Name", text("L1"))}, {named("InstanceID", uint32(1))}};
@@ -135,7 +135,7 @@ TEST_F(RecordTest, APathWithoutTheKeyNamesNothingAndChangesNothing) {
                     refused);
         EXPECT_THAT(gate().deleteInstance(path), refused);
     }
-    EXPECT_EQ(valueIn(got("L1"), "Lessor"), "ACME");
+    EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "ACME");
 }
 
 TEST_F(RecordTest, NamesOfClassesAndKeysIgnoreLetterCase) {
@@ -147,7 +147,7 @@ TEST_F(RecordTest, NamesOfClassesAndKeysIgnoreLetterCase) {
     EXPECT_THAT(identifiers(), IsEmpty());
 }
 
-TEST_F(RecordTest, ANullKeyInEveryDisguiseIsNoKey) {
+TEST_F(RecordTest, ANullKeyInAnyRepresentationIsRefused) {
     create("L1");
     const ObjectPath path = keyedPath(lease, "L1");
     CMPIData disguised{};
@@ -167,13 +167,13 @@ TEST_F(RecordTest, ANullKeyInEveryDisguiseIsNoKey) {
     EXPECT_THAT(identifiers(), ElementsAre("L1"));
 }
 
-TEST_F(RecordTest, AModificationChangesWhatItCarriesAndNothingElse) {
+TEST_F(RecordTest, AModificationChangesOnlyThePropertiesOfTheInstance) {
     create("L1", {named("Lessor", text("ACME")), named("LeaseTerm", uint32(36)), named("RenewalOption", boolean(true)),
                   named("BaseTermCommencementDate", dateTime("20260101000000.000000+060"))});
     std::vector<NamedValue> properties = allNull();
     properties[4] = named("BaseRent", text("12 EUR"));
     EXPECT_THAT(modify("L1", properties), isDone());
-    const Instance changed = got("L1");
+    const Instance changed = instanceOf("L1");
     EXPECT_EQ(valueIn(changed, "BaseRent"), "12 EUR");
     EXPECT_EQ(valueIn(changed, "Lessor"), "ACME");
     EXPECT_EQ(valueIn(changed, "LeaseTerm"), "36");
@@ -181,79 +181,79 @@ TEST_F(RecordTest, AModificationChangesWhatItCarriesAndNothingElse) {
     EXPECT_EQ(valueIn(changed, "BaseTermCommencementDate"), "20260101000000.000000+060");
 }
 
-TEST_F(RecordTest, AModificationHonoursItsPropertyListInAnyLetterCase) {
+TEST_F(RecordTest, AModificationAppliesItsPropertyListInAnyLetterCase) {
     create("L1", {named("Lessor", text("ACME")), named("LeaseTerm", uint32(36))});
     const ObjectPath path = keyedPath(lease, "L1");
     const Instance sent =
         testsupport::instance(path, {named("InstanceID", text("L1")), named("Lessor", text("Other")),
                                      named("LeaseTerm", uint32(48)), named("Caption", text("not listed"))});
     EXPECT_THAT(gate().modifyInstance(path, sent, {{"instanceid", "LEASETERM"}}), isDone());
-    EXPECT_EQ(valueIn(got("L1"), "Lessor"), "ACME");
-    EXPECT_EQ(valueIn(got("L1"), "LeaseTerm"), "48");
+    EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "ACME");
+    EXPECT_EQ(valueIn(instanceOf("L1"), "LeaseTerm"), "48");
     EXPECT_THAT(gate().modifyInstance(path, sent, cimhost::PropertyList(std::vector<std::string>{})), isDone());
-    EXPECT_EQ(valueIn(got("L1"), "Lessor"), "ACME");
+    EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "ACME");
 }
 
-TEST_F(RecordTest, AnInstanceThatComesBackAsItWasIsAccepted) {
+TEST_F(RecordTest, AnUnchangedInstanceIsAccepted) {
     create("L1",
            {named("Lessor", text("ACME")), named("BaseTermCommencementDate", dateTime("20260101000000.000000+060"))});
-    Instance sent = got("L1");
+    Instance sent = instanceOf("L1");
     for (NamedValue& property : sent.properties) {
         property = property.name == "Lessor" ? named("Lessor", text("Other")) : property;
     }
     EXPECT_THAT(gate().modifyInstance(keyedPath(lease, "L1"), sent), isDone());
-    EXPECT_EQ(valueIn(got("L1"), "Lessor"), "Other");
+    EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "Other");
 }
 
-TEST_F(RecordTest, ADateWithoutOffsetMayBeWrittenInEitherWay) {
+TEST_F(RecordTest, AnOffsetOfZeroMayHaveEitherSign) {
     create("L1", {named("BaseTermCommencementDate", dateTime("20260101000000.000000+000"))});
     const std::string stored = testsupport::readFile(dataFile("Lease.dat"));
     EXPECT_THAT(modify("L1", {named("BaseTermCommencementDate", dateTime("20260101000000.000000-000"))}), isDone());
     EXPECT_EQ(testsupport::readFile(dataFile("Lease.dat")), stored) << "no change";
     EXPECT_THAT(modify("L1", {named("BaseTermCommencementDate", dateTime("20260102000000.000000-000"))}), isDone());
-    EXPECT_EQ(valueIn(got("L1"), "BaseTermCommencementDate"), "20260102000000.000000-000");
+    EXPECT_EQ(valueIn(instanceOf("L1"), "BaseTermCommencementDate"), "20260102000000.000000-000");
 }
 
-TEST_F(RecordTest, ADateIsTakenAwayByZeros) {
+TEST_F(RecordTest, ZerosUnsetADate) {
     for (const char* zeros : {"00000000000000.000000-000", "00000000000000.000000+000"}) {
         create("L1", {named("BaseTermCommencementDate", dateTime("20260101000000.000000+060"))});
         EXPECT_THAT(modify("L1", {named("BaseTermCommencementDate", dateTime(zeros))}), isDone()) << zeros;
-        EXPECT_EQ(valueIn(got("L1"), "BaseTermCommencementDate"), std::nullopt);
+        EXPECT_EQ(valueIn(instanceOf("L1"), "BaseTermCommencementDate"), std::nullopt);
         EXPECT_THAT(modify("L1", {named("BaseTermCommencementDate", dateTime(zeros))}), isDone()) << "again";
         EXPECT_THAT(testsupport::readFile(dataFile("Lease.dat")), HasSubstr("\n00000000000000.000000-000\n"));
         unload();
-        EXPECT_EQ(valueIn(got("L1"), "BaseTermCommencementDate"), std::nullopt);
+        EXPECT_EQ(valueIn(instanceOf("L1"), "BaseTermCommencementDate"), std::nullopt);
         remove("L1");
     }
 }
 
-TEST_F(RecordTest, AModificationThatAManagerTrimsChangesNothingElse) {
+TEST_F(RecordTest, AModificationWithTrimmedValuesChangesNothingElse) {
     testsupport::writeFile(dataFile("Lease.dat"),
                            "1\nL1\n_Bail_Ren\xc3\xa9\n00000000000000.000000-000\n0\n0\n0\n0\n0\nACME_\n*\n*\n*\n0\n");
-    const Instance before = got("L1");
+    const Instance before = instanceOf("L1");
     ASSERT_EQ(valueIn(before, "Lessor"), " Bail Ren\xc3\xa9");
     ASSERT_EQ(valueIn(before, "BaseRent"), "ACME ");
     for (const char* lessor : {"Bail Ren", "Bail Ren\xc3\xa9"}) {
         EXPECT_THAT(modify("L1", {named("Lessor", text(lessor)), named("BaseRent", text("ACME")),
                                   named("LeaseTerm", uint32(3))}),
                     isDone());
-        EXPECT_EQ(valueIn(got("L1"), "Lessor"), valueIn(before, "Lessor"));
-        EXPECT_EQ(valueIn(got("L1"), "BaseRent"), "ACME ");
+        EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), valueIn(before, "Lessor"));
+        EXPECT_EQ(valueIn(instanceOf("L1"), "BaseRent"), "ACME ");
     }
-    EXPECT_EQ(valueIn(got("L1"), "LeaseTerm"), "3");
+    EXPECT_EQ(valueIn(instanceOf("L1"), "LeaseTerm"), "3");
 }
 
-TEST_F(RecordTest, ALastLetterOutsideAsciiCanBeTakenAwayByName) {
+TEST_F(RecordTest, APropertyListPermitsRemovingATrailingNonAsciiLetter) {
     create("L1", {named("Lessor", text("Bail Ren\xc3\xa9"))});
     const ObjectPath path = keyedPath(lease, "L1");
     const Instance sent = testsupport::instance(path, {named("Lessor", text("Bail Ren"))});
     EXPECT_THAT(gate().modifyInstance(path, sent), isDone());
-    EXPECT_EQ(valueIn(got("L1"), "Lessor"), "Bail Ren\xc3\xa9") << "it may just have come back";
+    EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "Bail Ren\xc3\xa9") << "a manager may have trimmed it";
     EXPECT_THAT(gate().modifyInstance(path, sent, {{"Lessor"}}), isDone());
-    EXPECT_EQ(valueIn(got("L1"), "Lessor"), "Bail Ren");
+    EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "Bail Ren");
 }
 
-TEST_F(RecordTest, AChangedReadOnlyPropertyIsRefusedByNameWithNothingChanged) {
+TEST_F(RecordTest, AChangedReadOnlyPropertyIsRefusedByNameAndNothingChanges) {
     create("L1", {named("Lessor", text("ACME"))});
     const std::vector<NamedValue> readOnly{named("InstanceID", text("L2")), named("ElementName", text("mine")),
                                            named("ChangeableType", testsupport::uint16(1))};
@@ -261,7 +261,7 @@ TEST_F(RecordTest, AChangedReadOnlyPropertyIsRefusedByNameWithNothingChanged) {
         EXPECT_THAT(modify("L1", {named("Lessor", text("Other")), property}),
                     isRefused(CMPI_RC_ERR_INVALID_PARAMETER, property.name));
     }
-    EXPECT_EQ(valueIn(got("L1"), "Lessor"), "ACME");
+    EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "ACME");
     EXPECT_THAT(identifiers(), ElementsAre("L1"));
 }
 
@@ -271,17 +271,17 @@ TEST_F(RecordTest, UnknownPropertiesAreRefusedByName) {
     const ObjectPath path = keyedPath(lease, "L1");
     const Instance sent = testsupport::instance(path, {named("Lessor", text("Other"))});
     EXPECT_THAT(gate().modifyInstance(path, sent, {{"Leasor"}}), isRefused(CMPI_RC_ERR_NO_SUCH_PROPERTY, "Leasor"));
-    EXPECT_EQ(valueIn(got("L1"), "Lessor"), "ACME");
+    EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "ACME");
 }
 
-TEST_F(RecordTest, IntegersOfAnyTypeAreTakenWhenTheyFit) {
+TEST_F(RecordTest, IntegersOfAnyTypeAreAcceptedIfTheyFit) {
     create("L1");
     EXPECT_THAT(modify("L1", {named("LeaseTerm", testsupport::uint64(4294967295))}), isDone());
-    EXPECT_EQ(valueIn(got("L1"), "LeaseTerm"), "4294967295");
+    EXPECT_EQ(valueIn(instanceOf("L1"), "LeaseTerm"), "4294967295");
     for (const auto& value : {testsupport::uint64(4294967296), testsupport::sint32(-1), text("12"), boolean(true)}) {
         EXPECT_THAT(modify("L1", {named("LeaseTerm", value)}), isRefused(CMPI_RC_ERR_TYPE_MISMATCH, "LeaseTerm"));
     }
-    EXPECT_EQ(valueIn(got("L1"), "LeaseTerm"), "4294967295");
+    EXPECT_EQ(valueIn(instanceOf("L1"), "LeaseTerm"), "4294967295");
 }
 
 TEST_F(RecordTest, ValuesOfAnotherTypeAreRefusedByName) {
@@ -296,14 +296,14 @@ TEST_F(RecordTest, ValuesOfAnotherTypeAreRefusedByName) {
         EXPECT_THAT(modify("L1", {value}), isRefused(CMPI_RC_ERR_TYPE_MISMATCH, value.name));
         EXPECT_THAT(create("L2", {value}), isRefused(CMPI_RC_ERR_TYPE_MISMATCH, value.name));
     }
-    EXPECT_EQ(valueIn(got("L1"), "RenewalOption"), "TRUE");
-    EXPECT_EQ(valueIn(got("L1"), "Lessor"), "ACME");
+    EXPECT_EQ(valueIn(instanceOf("L1"), "RenewalOption"), "TRUE");
+    EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "ACME");
     EXPECT_THAT(modify("L1", {named("BaseTermCommencementDate", text("20260101000000.000000+060"))}), isDone())
-        << "the text of a datetime";
+        << "the string of a datetime";
     EXPECT_THAT(identifiers(), ElementsAre("L1"));
 }
 
-TEST_F(RecordTest, DeletedRecordsAreGoneFromTableAndFile) {
+TEST_F(RecordTest, DeletedRecordsAreRemovedFromTableAndFile) {
     create("L1");
     create("L2");
     EXPECT_THAT(remove("L1"), isDone());
@@ -312,15 +312,15 @@ TEST_F(RecordTest, DeletedRecordsAreGoneFromTableAndFile) {
     EXPECT_THAT(remove("L1"), isRefused(CMPI_RC_ERR_NOT_FOUND, lease));
 }
 
-TEST_F(RecordTest, WhatWasStoredIsThereAfterTheLibraryWasLoadedAnew) {
+TEST_F(RecordTest, StoredValuesSurviveReloadingTheLibrary) {
     create("/system/computer1", {named("Lessor", text("ACME Leasing"))});
     create("W1", {named("Warrantor", text("Acme Service"))}, warranty);
     unload();
-    EXPECT_EQ(valueIn(got("/system/computer1"), "Lessor"), "ACME Leasing");
-    EXPECT_EQ(valueIn(got("W1", warranty), "Warrantor"), "Acme Service");
+    EXPECT_EQ(valueIn(instanceOf("/system/computer1"), "Lessor"), "ACME Leasing");
+    EXPECT_EQ(valueIn(instanceOf("W1", warranty), "Warrantor"), "Acme Service");
 }
 
-TEST_F(RecordTest, OperationsThatAClassDoesNotHaveAreNotSupported) {
+TEST_F(RecordTest, UnsupportedOperationsAreRefused) {
     const ObjectPath path = classPath(agent);
     const Instance none = testsupport::instance(path);
     EXPECT_THAT(gate().createInstance(path, none), isRefused(CMPI_RC_ERR_NOT_SUPPORTED, agent));
@@ -332,7 +332,7 @@ TEST_F(RecordTest, OperationsThatAClassDoesNotHaveAreNotSupported) {
                 isRefused(CMPI_RC_ERR_NOT_SUPPORTED, "queries"));
 }
 
-TEST_F(RecordTest, ClassesOfOthersAreInvalid) {
+TEST_F(RecordTest, OtherClassesAreInvalid) {
     for (const char* other : {"VELKO_ComputerSystem", "VELKO_Leas", "VELKO_LeaseX", ""}) {
         const ObjectPath path = classPath(other);
         const auto refused = isRefused(CMPI_RC_ERR_INVALID_CLASS, other);

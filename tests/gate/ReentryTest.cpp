@@ -8,7 +8,7 @@
 #include <mutex>
 #include <thread>
 
-// Providers of the object manager that ask the gate something while they are asked by it.
+// Providers that call the gate while the gate waits for their response to an up-call.
 
 namespace gatetest {
 namespace {
@@ -16,7 +16,7 @@ namespace {
 constexpr int clients = 8;
 constexpr int rounds = 20 / SHARES;
 
-/** Ends the program when it has not gone by in time: requests that wait for each other would never end. */
+/** Aborts the program if it is not destroyed in time, since requests that wait for each other would never end. */
 class Deadline {
 public:
     Deadline() : watch([this] { await(); }) {}
@@ -35,7 +35,7 @@ private:
     void await() {
         std::unique_lock<std::mutex> lock(mutex);
         if (!changed.wait_for(lock, std::chrono::seconds(100), [&] { return isMet; })) {
-            std::fputs("requests that ask each other do not come to an end\n", stderr);
+            std::fputs("deadlock: requests wait for each other\n", stderr);
             std::abort();
         }
     }
@@ -46,10 +46,10 @@ private:
     std::thread watch;
 };
 
-/** How an object manager calls the provider of an up-call. */
+/** The thread on which an object manager calls the provider of an up-call. */
 enum class UpCallThread { same, another };
 
-/** A broker whose provider of computers reads and changes leases through the gate before it answers. */
+/** A broker whose provider of computers reads and changes leases through the gate before it responds. */
 class ReenteringBroker {
 public:
     ReenteringBroker(const CMPIBroker& real, UpCallThread itsThread)
@@ -70,7 +70,7 @@ public:
 
 private:
     void reenter() {
-        const ObjectPath path = keyedPath(lease, firstPlace);
+        const ObjectPath path = keyedPath(lease, firstNode);
         const int number = ++reentries;
         const auto term = uint32(static_cast<unsigned>(number));
         const bool areGood =
@@ -101,10 +101,10 @@ private:
 
 class ReentryTest : public GateTest, public testing::WithParamInterface<UpCallThread> {};
 
-TEST_P(ReentryTest, ProvidersThatAreAskedMayAskTheGateUnderLoad) {
+TEST_P(ReentryTest, ProvidersOfUpCallsCanCallTheGateUnderLoad) {
     const Deadline deadline;
-    create(firstPlace);
-    create(secondPlace);
+    create(firstNode);
+    create(secondNode);
     ReenteringBroker reentering(*broker.handle(), GetParam());
     reentering.library = &gate();
     gate().createInstanceMI(reentering.handle(), nullptr);
@@ -116,7 +116,7 @@ TEST_P(ReentryTest, ProvidersThatAreAskedMayAskTheGateUnderLoad) {
             for (int round = 0; round < rounds; ++round) {
                 const Outcome names = gate().associatorNames(computerPath("alpha"), {leaseSetting, {}, {}, {}});
                 const Outcome links = gate().enumerateInstances(classPath(leaseSetting));
-                wrong += identifiersOf(names.paths()) == std::vector<std::string>{firstPlace} ? 0 : 1;
+                wrong += identifiersOf(names.paths()) == std::vector<std::string>{firstNode} ? 0 : 1;
                 wrong += links.instances().size() == 2 ? 0 : 1;
             }
         });
@@ -127,7 +127,7 @@ TEST_P(ReentryTest, ProvidersThatAreAskedMayAskTheGateUnderLoad) {
     EXPECT_EQ(wrong, 0);
     EXPECT_EQ(reentering.failures, 0);
     EXPECT_GE(reentering.reentries, 2 * clients * rounds);
-    unload();  // before the other broker goes
+    unload();  // before the other broker is destroyed
 }
 
 INSTANTIATE_TEST_SUITE_P(Gate, ReentryTest, testing::Values(UpCallThread::same, UpCallThread::another),

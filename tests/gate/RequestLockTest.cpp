@@ -1,4 +1,4 @@
-#include "Diary.h"
+#include "EventLog.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -10,7 +10,7 @@
 #include <thread>
 #include <vector>
 
-// The order in which requests hold the lock.
+// The order in which requests acquire the lock.
 
 namespace gatetest {
 namespace {
@@ -18,7 +18,7 @@ namespace {
 using gate::RequestLock;
 using testing::ElementsAre;
 
-/** Releases the lock for a while, as for a service of the object manager. */
+/** Releases the lock temporarily, as during an up-call. */
 struct ScopedRelease {
     ScopedRelease() { gate::theRequestLock.release(); }
     ~ScopedRelease() { gate::theRequestLock.reacquire(); }
@@ -26,43 +26,43 @@ struct ScopedRelease {
     ScopedRelease& operator=(const ScopedRelease&) = delete;
 };
 
-TEST(RequestLockTest, ItIsPassedOnInOrderOfArrival) {
+TEST(RequestLockTest, IsPassedOnInOrderOfArrival) {
     RequestLock lock;
-    Diary diary;
+    EventLog log;
     std::vector<std::thread> threads;
     lock.acquire();
     for (std::size_t number = 0; number < 8; ++number) {
         threads.emplace_back([&, number] {
             lock.acquire();
-            diary.note(std::to_string(number));
+            log.note(std::to_string(number));
             lock.release();
         });
         awaitQueue(lock, number + 1);
     }
     lock.release();
     join(threads);
-    EXPECT_THAT(diary.all(), ElementsAre("0", "1", "2", "3", "4", "5", "6", "7"));
+    EXPECT_THAT(log.all(), ElementsAre("0", "1", "2", "3", "4", "5", "6", "7"));
 }
 
 TEST(RequestLockTest, ANewcomerDoesNotOvertakeAWaiter) {
     RequestLock lock;
-    Diary diary;
+    EventLog log;
     lock.acquire();
     std::thread other([&] {
         lock.acquire();
-        diary.note("waiter");
+        log.note("waiter");
         lock.release();
     });
     awaitQueue(lock, 1);
     lock.release();
     lock.acquire();
-    diary.note("newcomer");
+    log.note("newcomer");
     lock.release();
     other.join();
-    EXPECT_THAT(diary.all(), ElementsAre("waiter", "newcomer"));
+    EXPECT_THAT(log.all(), ElementsAre("waiter", "newcomer"));
 }
 
-TEST(RequestLockTest, OneThreadHoldsItAtMost) {
+TEST(RequestLockTest, IsHeldByAtMostOneThread) {
     RequestLock lock;
     int inside = 0;
     int most = 0;
@@ -84,27 +84,27 @@ TEST(RequestLockTest, OneThreadHoldsItAtMost) {
     EXPECT_EQ(total, 16 * 500);
 }
 
-TEST(RequestLockTest, WhileReleasedItCanBeAcquiredByTheSameAndOtherThreads) {
-    Diary diary;
+TEST(RequestLockTest, CanBeAcquiredByTheSameAndOtherThreadsWhileReleased) {
+    EventLog log;
     const gate::LockGuard guard;
-    diary.note("first holds it");
+    log.note("first holds it");
     {
         const ScopedRelease released;
         {
             const gate::LockGuard again;
-            diary.note("same thread");
+            log.note("same thread");
         }
         std::thread([&] {
             const gate::LockGuard other;
-            diary.note("other thread");
+            log.note("other thread");
         }).join();
     }
-    diary.note("first again");
-    EXPECT_THAT(diary.all(), ElementsAre("first holds it", "same thread", "other thread", "first again"));
+    log.note("first again");
+    EXPECT_THAT(log.all(), ElementsAre("first holds it", "same thread", "other thread", "first again"));
 }
 
 TEST(RequestLockTest, ReacquiringWaitsForTheHolder) {
-    Diary diary;
+    EventLog log;
     std::thread first;
     {
         const gate::LockGuard guard;
@@ -112,48 +112,48 @@ TEST(RequestLockTest, ReacquiringWaitsForTheHolder) {
             const gate::LockGuard own;
             {
                 const ScopedRelease released;
-                diary.note("released");
-                diary.await("other in");
+                log.note("released");
+                log.await("other in");
             }
-            diary.note("again");
+            log.note("again");
         });
         awaitQueue(gate::theRequestLock, 1);
     }
-    diary.await("released");
+    log.await("released");
     {
         const gate::LockGuard guard;
-        diary.note("other in");
+        log.note("other in");
         awaitQueue(gate::theRequestLock, 1);
-        diary.note("other out");
+        log.note("other out");
     }
     first.join();
-    EXPECT_THAT(diary.all(), ElementsAre("released", "other in", "other out", "again"));
+    EXPECT_THAT(log.all(), ElementsAre("released", "other in", "other out", "again"));
 }
 
 /** Acquires the lock, and can be cancelled after releasing it. */
-void* acquireOnce(void* diary) {
+void* acquireOnce(void* log) {
     {
         const gate::LockGuard guard;
         pthread_testcancel();
-        static_cast<Diary*>(diary)->note("inside");
+        static_cast<EventLog*>(log)->note("inside");
     }
     pthread_testcancel();
     return nullptr;
 }
 
 TEST(RequestLockTest, ACancelledThreadEndsAfterItHasReleasedTheLock) {
-    Diary diary;
+    EventLog log;
     pthread_t thread{};
     {
         const gate::LockGuard guard;
-        ASSERT_EQ(pthread_create(&thread, nullptr, &acquireOnce, &diary), 0);
+        ASSERT_EQ(pthread_create(&thread, nullptr, &acquireOnce, &log), 0);
         awaitQueue(gate::theRequestLock, 1);
         pthread_cancel(thread);
     }
     void* result = nullptr;
     ASSERT_EQ(pthread_join(thread, &result), 0);
     EXPECT_EQ(result, PTHREAD_CANCELED);
-    EXPECT_THAT(diary.all(), ElementsAre("inside"));
+    EXPECT_THAT(log.all(), ElementsAre("inside"));
     const gate::LockGuard next;
     EXPECT_EQ(gate::theRequestLock.waiting(), 0U) << "the lock was released";
 }

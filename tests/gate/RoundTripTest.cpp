@@ -8,7 +8,7 @@
 
 #include "lab/emulation/ManagerEmulation.h"
 
-// What a client has read and sends back, under object managers that change it on the way.
+// Instances that clients read, change and send back, under object managers that alter values.
 
 namespace gatetest {
 namespace {
@@ -29,16 +29,16 @@ protected:
     }
     ~RoundTripTest() override { agentEnvironment::clear(); }
 
-    /** Sends back all that is read, with one property changed, as clients do that have no property list. */
+    /** Sends all read properties back with one of them changed, like clients that do not send a property list. */
     void change(const ObjectPath& path, const NamedValue& changed) {
-        const Instance before = gate.got(path);
+        const Instance before = gate.instanceOf(path);
         std::vector<NamedValue> sent = before.properties;
         for (NamedValue& property : sent) {
             property = property.name == changed.name ? changed : property;
         }
         const cimhost::Status status = gate.modify(path, sent);
         EXPECT_EQ(status.rc, CMPI_RC_OK) << status.message;
-        const Instance after = gate.got(path);
+        const Instance after = gate.instanceOf(path);
         EXPECT_EQ(valueIn(after, changed.name), valueIn(testsupport::instance(path, {changed}), changed.name));
         for (const NamedValue& property : before.properties) {
             if (property.name != changed.name && property.name != "LocalDateTime") {
@@ -50,36 +50,36 @@ protected:
     ManagedGate gate{GetParam()};
 };
 
-TEST_P(RoundTripTest, OfALeaseChangesOnlyWhatIsChanged) {
+TEST_P(RoundTripTest, OfALeaseChangesOnlyTheChangedProperty) {
     change(keyedPath(lease, "L1"), named("LeaseTerm", uint32(3)));
     change(keyedPath(lease, "L1"), named("TerminationValue", text("12 EUR")));
 }
 
-TEST_P(RoundTripTest, OfAssetDataChangesOnlyWhatIsChanged) {
+TEST_P(RoundTripTest, OfAssetDataChangesOnlyTheChangedProperty) {
     const ObjectPath path = gate.paths(asset).front();
     change(path, named("AssetNumber", text("A 1")));
     change(path, named("PersonalizedData4", text("12")));
 }
 
-TEST_P(RoundTripTest, PropertyListsHoldForReadingAndForChanging) {
+TEST_P(RoundTripTest, AppliesPropertyListsToReadingAndChanging) {
     const ObjectPath path = keyedPath(lease, "L1");
-    const auto got = gate.manager().perform(Request::getInstance(path, {{"lessor"}}));
-    ASSERT_TRUE(got.ok()) << got.status.message;
-    EXPECT_THAT(testsupport::namesOf(got.instance().properties), UnorderedElementsAre("InstanceID", "Lessor"));
+    const auto received = gate.manager().perform(Request::getInstance(path, {{"lessor"}}));
+    ASSERT_TRUE(received.ok()) << received.status.message;
+    EXPECT_THAT(testsupport::namesOf(received.instance().properties), UnorderedElementsAre("InstanceID", "Lessor"));
     const auto listed = gate.manager().perform(Request::enumerateInstances(classPath(lease), {{"LeaseTerm"}}));
     ASSERT_EQ(listed.instances.size(), 1U) << listed.status.message;
     EXPECT_THAT(testsupport::namesOf(listed.instance().properties), UnorderedElementsAre("InstanceID", "LeaseTerm"));
     const Instance sent =
         testsupport::instance(path, {named("LeaseTerm", uint32(9)), named("FairMarketValue", text("not listed"))});
     EXPECT_TRUE(gate.manager().perform(Request::modifyInstance(path, sent, {{"LeaseTerm"}})).ok());
-    EXPECT_EQ(valueIn(gate.got(path), "LeaseTerm"), "9");
-    EXPECT_EQ(valueIn(gate.got(path), "FairMarketValue"), "");
+    EXPECT_EQ(valueIn(gate.instanceOf(path), "LeaseTerm"), "9");
+    EXPECT_EQ(valueIn(gate.instanceOf(path), "FairMarketValue"), "");
 }
 
 INSTANTIATE_TEST_SUITE_P(Gate, RoundTripTest, testing::ValuesIn(cimhost::lab::everyManager),
                          cimhost::lab::ManagerName());
 
-/** A result that takes the first instance and then waits, as for a client that reads slowly. */
+/** A result that blocks after the first instance, as for a client that reads slowly. */
 class SlowReader {
 public:
     explicit SlowReader(const CMPIResult& itsReal) : real(itsReal), functions(*real.ft), result(real) {
@@ -97,7 +97,7 @@ public:
         changed.wait(lock, [] { return hasFirst; });
     }
 
-    static void goOn() {
+    static void resume() {
         const std::lock_guard<std::mutex> lock(mutex);
         isReading = true;
         changed.notify_all();
@@ -127,7 +127,7 @@ private:
 
 class SlowReaderTest : public GateTest {};
 
-TEST_F(SlowReaderTest, HoldsNobodyUp) {
+TEST_F(SlowReaderTest, DoesNotBlockOtherRequests) {
     create("L1");
     create("L2");
     std::thread slow([&] {
@@ -144,7 +144,7 @@ TEST_F(SlowReaderTest, HoldsNobodyUp) {
     EXPECT_THAT(modify("L1", {named("LeaseTerm", uint32(3))}), isDone());
     EXPECT_THAT(remove("L2"), isDone());
     EXPECT_THAT(identifiers(), testing::ElementsAre("L1"));
-    SlowReader::goOn();
+    SlowReader::resume();
     slow.join();
 }
 

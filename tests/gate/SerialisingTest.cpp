@@ -16,25 +16,25 @@
 #include "support/Files.h"
 #include "support/UnderTest.h"
 
-// How many requests are inside the provider at a time.
+// Number of concurrent requests in the provider.
 
 namespace gatetest {
 namespace {
 
-/** Whether a thread of this process sleeps, or has ended: it has come as far as it can. */
+/** Returns whether a thread of this process sleeps or has ended. */
 bool isAsleep(pid_t thread) {
     std::ifstream file("/proc/self/task/" + std::to_string(thread) + "/stat");
     std::string stat;
     return !std::getline(file, stat) || stat.compare(stat.rfind(')') + 1, 2, " S") == 0;
 }
 
-/** Counts the threads that are in the broker's newInstance, that is, inside the provider. */
+/** Counts the threads that execute the broker's newInstance and are therefore in the provider. */
 class InsideCounter {
 public:
-    explicit InsideCounter(const CMPIBroker& real) : makers(*real.eft), broker(real) {
-        original = makers.newInstance;
-        makers.newInstance = &newInstance;
-        broker.eft = &makers;
+    explicit InsideCounter(const CMPIBroker& real) : factories(*real.eft), broker(real) {
+        original = factories.newInstance;
+        factories.newInstance = &newInstance;
+        broker.eft = &factories;
         current = this;
     }
     InsideCounter(const InsideCounter&) = delete;
@@ -42,31 +42,33 @@ public:
 
     const CMPIBroker* handle() const { return &broker; }
 
-    /** A thread is about to make its request. */
-    void comes() {
+    /** Registers a thread that is about to send its request. */
+    void arrive() {
         const std::lock_guard<std::mutex> lock(mutex);
-        ++coming;
+        ++arrived;
         threads.push_back(gettid());
         changed.notify_all();
     }
 
-    /** Waits until somebody is inside. */
+    /** Waits until a request is in the provider. */
     void awaitInside() {
         std::unique_lock<std::mutex> lock(mutex);
         changed.wait(lock, [&] { return inside > 0; });
     }
 
-    /** Whether somebody is inside, or nobody ever was. */
+    /** Returns whether a request is in the provider, or none ever was. */
     bool isBusy() {
         const std::lock_guard<std::mutex> lock(mutex);
         return inside > 0 || most == 0;
     }
 
-    /** Inside, wait for so many threads inside (or for all to come); for what is to be shown. */
+    /**
+     * Conditions under which newInstance continues: the number of requests in the provider, and of arrived threads.
+     */
     int awaitedInside = 0;
-    int awaitedComing = 0;
+    int awaitedArrivals = 0;
     int most = 0;
-    bool awaitsSleep = false;  ///< inside, wait also until all others have come as far as they can
+    bool awaitsSleep = false;  ///< newInstance also waits until all other arrived threads sleep
     std::function<void()> whenOthersSleep = [] {};
 
 private:
@@ -76,7 +78,8 @@ private:
         ++self.inside;
         self.most = std::max(self.most, self.inside);
         self.changed.notify_all();
-        self.changed.wait(lock, [&] { return self.most >= self.awaitedInside && self.coming >= self.awaitedComing; });
+        self.changed.wait(lock,
+                          [&] { return self.most >= self.awaitedInside && self.arrived >= self.awaitedArrivals; });
         const bool hasWaited = std::exchange(self.awaitsSleep, false);
         const std::vector<pid_t> others = hasWaited ? self.threads : std::vector<pid_t>{};
         lock.unlock();
@@ -100,9 +103,9 @@ private:
     std::mutex mutex;
     std::condition_variable changed;
     int inside = 0;
-    int coming = 0;
+    int arrived = 0;
     std::vector<pid_t> threads;
-    CMPIBrokerEncFT makers;
+    CMPIBrokerEncFT factories;
     CMPIBroker broker;
 };
 
@@ -115,18 +118,18 @@ protected:
     }
     ~SerialisingTest() override { agentEnvironment::clear(); }
 
-    /** All clients enumerate the one warranty at a time. */
+    /** All clients enumerate the only warranty concurrently. */
     void load(const std::string& file, const char* name, int insideAtOnce) {
         testsupport::RecordingBroker broker;
         InsideCounter counter(*broker.handle());
         counter.awaitedInside = insideAtOnce;
-        counter.awaitedComing = clientCount;
+        counter.awaitedArrivals = clientCount;
         counter.awaitsSleep = insideAtOnce == 1;
         testsupport::ProviderLibrary library(file, name, broker);
         ASSERT_NE(library.createInstanceMI(counter.handle(), nullptr), nullptr);
         std::vector<Outcome> outcomes(clientCount);
         onThreads(clientCount, [&](int number) {
-            counter.comes();
+            counter.arrive();
             outcomes[static_cast<std::size_t>(number)] = library.enumerateInstances(classPath(warranty));
         });
         for (const Outcome& outcome : outcomes) {
@@ -138,11 +141,11 @@ protected:
     SilentLog silence;
 };
 
-TEST_F(SerialisingTest, ThroughTheGateOneRequestAtATimeIsInside) {
+TEST_F(SerialisingTest, TheGateSerializesRequests) {
     load(testsupport::underTest(GATE_LIBRARY), "LeaseAndWarrantyGate", 1);
 }
 
-TEST_F(SerialisingTest, NoKeyOrValueOfAClientIsReadWhileAnotherRequestIsInside) {
+TEST_F(SerialisingTest, TheGateReadsNoArgumentsWhileAnotherRequestIsInTheProvider) {
     const ObjectPath path = keyedPath(warranty, "W1");
     const ObjectPath association =
         testsupport::objectPath(nameSpace, warrantySetting,
@@ -166,7 +169,7 @@ TEST_F(SerialisingTest, NoKeyOrValueOfAClientIsReadWhileAnotherRequestIsInside) 
         InsideCounter counter(*broker.handle());
         Library library(testsupport::underTest(GATE_LIBRARY), "LeaseAndWarrantyGate", broker);
         ASSERT_NE(library.createInstanceMI(counter.handle(), nullptr), nullptr);
-        counter.awaitedComing = 2;
+        counter.awaitedArrivals = 2;
         counter.awaitsSleep = true;
         int readBehindLock = -1;
         counter.whenOthersSleep = [&] {
@@ -174,12 +177,12 @@ TEST_F(SerialisingTest, NoKeyOrValueOfAClientIsReadWhileAnotherRequestIsInside) 
                              broker.count("CMPIObjectPathFT.getKey") + broker.count("CMPIObjectPathFT.getKeyAt");
         };
         std::thread inside([&] {
-            counter.comes();
+            counter.arrive();
             library.enumerateInstances(classPath(warranty));
         });
         counter.awaitInside();
         std::thread second([&] {
-            counter.comes();
+            counter.arrive();
             request(library);
         });
         inside.join();
@@ -188,7 +191,7 @@ TEST_F(SerialisingTest, NoKeyOrValueOfAClientIsReadWhileAnotherRequestIsInside) 
     }
 }
 
-/** A result that runs some work before it accepts a path. */
+/** A result that runs a function before it accepts a path. */
 class WorkingResult {
 public:
     WorkingResult(const CMPIResult& real, std::function<void()> itsWork) : functions(*real.ft), result(real) {
@@ -244,34 +247,34 @@ TEST_F(SerialisingTest, ADeletionWaitsUntilTheCreationHasReturnedItsPath) {
     EXPECT_THAT(library.enumerateInstanceNames(classPath(lease)), isAnswered(0));
 }
 
-TEST_F(SerialisingTest, WithoutItAllRequestsAreInsideAtOnce) {
+TEST_F(SerialisingTest, WithoutTheGateRequestsAreConcurrent) {
     load(testsupport::underTest(PROVIDER_LIBRARY), "LeaseAndWarrantyProvider", clientCount);
 }
 
-TEST_F(SerialisingTest, AFactoryCallDoesNotWaitForWhoIsInside) {
+TEST_F(SerialisingTest, AFactoryCallDoesNotWaitForRequests) {
     testsupport::RecordingBroker broker;
     InsideCounter counter(*broker.handle());
-    counter.awaitedComing = 1;
+    counter.awaitedArrivals = 1;
     testsupport::ProviderLibrary library(testsupport::underTest(GATE_LIBRARY), "LeaseAndWarrantyGate", broker);
     CMPIInstanceMI* first = library.createInstanceMI(counter.handle(), nullptr);
     std::thread request([&] { EXPECT_THAT(library.enumerateInstances(classPath(warranty)), isAnswered(1)); });
     counter.awaitInside();
     EXPECT_EQ(library.createInstanceMI(counter.handle(), nullptr), first);
-    counter.comes();
+    counter.arrive();
     request.join();
 }
 
-/** Ends the process while a request is inside the provider; with 9 if static objects went before it. */
-struct EndWhileInside {
+/** Exits while a request is in the provider; with 9 if static objects are destroyed before the request ends. */
+struct ExitWhileInside {
     static inline InsideCounter* counter = nullptr;
 
     static void run() {
-        // Never destroyed: the other thread uses them to the very end.
+        // Never destroyed, since the other thread uses them until the process ends.
         static auto& broker = *new testsupport::RecordingBroker;
         static auto& inside = *new InsideCounter(*broker.handle());
         counter = &inside;
-        inside.awaitedComing = 1;
-        // After the gate's static objects, which are not there yet.
+        inside.awaitedArrivals = 1;
+        // Runs after the destruction of the gate's static objects, which are constructed later.
         std::atexit([] {
             if (counter->isBusy()) {
                 std::_Exit(9);
@@ -280,17 +283,17 @@ struct EndWhileInside {
         static auto* library =
             new testsupport::ProviderLibrary(testsupport::underTest(GATE_LIBRARY), "LeaseAndWarrantyGate", broker);
         library->createInstanceMI(inside.handle(), nullptr);
-        // Before them.
-        std::atexit([] { counter->comes(); });
+        // Runs before it.
+        std::atexit([] { counter->arrive(); });
         std::thread([] { library->enumerateInstances(classPath(warranty)); }).detach();
         inside.awaitInside();
         std::exit(0);
     }
 };
 
-TEST_F(SerialisingTest, TheEndOfTheProcessWaitsForWhoIsInside) {
+TEST_F(SerialisingTest, ProcessExitWaitsForRequests) {
     testing::FLAGS_gtest_death_test_style = "threadsafe";
-    EXPECT_EXIT(EndWhileInside::run(), testing::ExitedWithCode(0), "");
+    EXPECT_EXIT(ExitWhileInside::run(), testing::ExitedWithCode(0), "");
 }
 
 }  // namespace

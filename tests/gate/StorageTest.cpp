@@ -26,36 +26,36 @@ using testsupport::readFile;
 
 using StorageTest = GateTest;
 
-/** While one of these lives, file systems say that they are full. */
-struct NoRoom {
+/** Makes file systems appear full during its lifetime. */
+struct FullFileSystem {
     static inline int count = 0;
 
-    NoRoom() { ++count; }
-    ~NoRoom() { --count; }
-    NoRoom(const NoRoom&) = delete;
-    NoRoom& operator=(const NoRoom&) = delete;
+    FullFileSystem() { ++count; }
+    ~FullFileSystem() { --count; }
+    FullFileSystem(const FullFileSystem&) = delete;
+    FullFileSystem& operator=(const FullFileSystem&) = delete;
 };
 
 /**
- * While one of these lives, files are opened to be rewritten as its course says: '+' for one that is, '-' for one
- * that is not; the last holds from then on.
+ * Controls opening files for writing during its lifetime: each '+' of the string lets a call succeed, each '-' makes
+ * it fail; the last character applies to all later calls.
  */
-struct Openings {
-    static inline const char* course = "+";
+struct OpenResults {
+    static inline const char* results = "+";
 
-    explicit Openings(const char* itsCourse) { course = itsCourse; }
-    ~Openings() { course = "+"; }
-    Openings(const Openings&) = delete;
-    Openings& operator=(const Openings&) = delete;
+    explicit OpenResults(const char* itsResults) { results = itsResults; }
+    ~OpenResults() { results = "+"; }
+    OpenResults(const OpenResults&) = delete;
+    OpenResults& operator=(const OpenResults&) = delete;
 
     static bool take() {
-        const bool isOpened = *course == '+';
-        course += course[1] != '\0' ? 1 : 0;
+        const bool isOpened = *results == '+';
+        results += results[1] != '\0' ? 1 : 0;
         return isOpened;
     }
 };
 
-/** What a change of a lease, each kind once, answers. */
+/** Returns the outcomes of a creation, a modification and a deletion of leases. */
 std::vector<Outcome> changes(testsupport::ProviderLibrary& gate) {
     const auto with = [](const std::string& id) {
         return testsupport::instance(keyedPath(lease, id), {named("LeaseTerm", uint32(9))});
@@ -64,7 +64,7 @@ std::vector<Outcome> changes(testsupport::ProviderLibrary& gate) {
             gate.modifyInstance(keyedPath(lease, "L1"), with("L1")), gate.deleteInstance(keyedPath(lease, "L1"))};
 }
 
-TEST_F(StorageTest, WithoutDataDirectoryNothingIsChanged) {
+TEST_F(StorageTest, AMissingDataDirectoryRefusesChanges) {
     create("L1", {named("LeaseTerm", uint32(1))});
     fs::remove_all(agentEnvironment::dataDirectory());
     for (const Outcome& outcome : changes(gate())) {
@@ -72,13 +72,13 @@ TEST_F(StorageTest, WithoutDataDirectoryNothingIsChanged) {
         EXPECT_THAT(outcome.message, HasSubstr("No such file or directory"));
     }
     EXPECT_THAT(identifiers(), ElementsAre("L1"));
-    EXPECT_EQ(valueIn(got("L1"), "LeaseTerm"), "1");
+    EXPECT_EQ(valueIn(instanceOf("L1"), "LeaseTerm"), "1");
     fs::create_directory(agentEnvironment::dataDirectory());
     EXPECT_THAT(modify("L1", {named("LeaseTerm", uint32(2))}), isDone()) << "once there is one again";
     EXPECT_THAT(readFile(dataFile("Lease.dat")), HasSubstr("L1\n"));
 }
 
-TEST_F(StorageTest, AFileThatCannotBeOpenedIsNamedAndNothingIsChanged) {
+TEST_F(StorageTest, AFileThatCannotBeOpenedIsNamedAndNothingChanges) {
     create("L1", {named("LeaseTerm", uint32(1))});
     fs::remove(dataFile("Lease.dat"));
     fs::create_directory(dataFile("Lease.dat"));
@@ -86,10 +86,10 @@ TEST_F(StorageTest, AFileThatCannotBeOpenedIsNamedAndNothingIsChanged) {
         EXPECT_THAT(outcome, isRefused(CMPI_RC_ERR_FAILED, "Lease.dat"));
     }
     EXPECT_THAT(identifiers(), ElementsAre("L1"));
-    EXPECT_EQ(valueIn(got("L1"), "LeaseTerm"), "1");
+    EXPECT_EQ(valueIn(instanceOf("L1"), "LeaseTerm"), "1");
 }
 
-TEST_F(StorageTest, WhatIsNoRegularFileIsNotWrittenTo) {
+TEST_F(StorageTest, OnlyRegularFilesAreWritten) {
     create("L1");
     fs::remove(dataFile("Lease.dat"));
     ASSERT_EQ(mkfifo(dataFile("Lease.dat").c_str(), 0600), 0);
@@ -97,7 +97,7 @@ TEST_F(StorageTest, WhatIsNoRegularFileIsNotWrittenTo) {
     EXPECT_THAT(identifiers(), ElementsAre("L1"));
 }
 
-TEST_F(StorageTest, WhenTheDiskIsFullANewRecordIsTakenBack) {
+TEST_F(StorageTest, AFullDiskRollsBackANewRecord) {
     create("L1", {named("LeaseTerm", uint32(1))});
     const std::string stored = readFile(dataFile("Lease.dat"));
     {
@@ -109,18 +109,18 @@ TEST_F(StorageTest, WhenTheDiskIsFullANewRecordIsTakenBack) {
     EXPECT_THAT(create("L2"), isAnswered(1));
 }
 
-TEST_F(StorageTest, WhenTheDiskIsFullANewRecordIsTakenBackWithItsValues) {
+TEST_F(StorageTest, AFullDiskRollsBackANewRecordWithValues) {
     create("L1", {named("LeaseTerm", uint32(1))});
     const std::string stored = readFile(dataFile("Lease.dat"));
     const FullDisk disk(2 * stored.size() + 10);
     const Outcome outcome = create("L2", {named("Lessor", text(std::string(100, 'A')))});
     EXPECT_THAT(outcome, isRefused(CMPI_RC_ERR_FAILED, "disk may be full"));
-    EXPECT_THAT(outcome.message, testing::Not(HasSubstr("damaged"))) << "it is whole again";
+    EXPECT_THAT(outcome.message, testing::Not(HasSubstr("damaged"))) << "it is complete again";
     EXPECT_EQ(readFile(dataFile("Lease.dat")), stored);
     EXPECT_THAT(identifiers(), ElementsAre("L1"));
 }
 
-TEST_F(StorageTest, WhenTheDiskIsFullAModificationIsTakenBack) {
+TEST_F(StorageTest, AFullDiskRollsBackAModification) {
     create("L1", {named("Lessor", text("ACME"))});
     create("L2");
     const std::string stored = readFile(dataFile("Lease.dat"));
@@ -130,10 +130,10 @@ TEST_F(StorageTest, WhenTheDiskIsFullAModificationIsTakenBack) {
                     isRefused(CMPI_RC_ERR_FAILED, "disk may be full"));
     }
     EXPECT_EQ(readFile(dataFile("Lease.dat")), stored);
-    EXPECT_EQ(valueIn(got("L1"), "Lessor"), "ACME");
+    EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "ACME");
 }
 
-/** Every property of every lease, in no order. */
+/** Returns every property of every lease, regardless of the order. */
 std::multiset<std::string> content(const Outcome& leases) {
     std::multiset<std::string> shown;
     for (const Instance& instance : leases.instances()) {
@@ -146,7 +146,7 @@ std::multiset<std::string> content(const Outcome& leases) {
     return shown;
 }
 
-TEST_F(StorageTest, ADeletionThatCannotBeStoredIsTakenBack) {
+TEST_F(StorageTest, ADeletionThatCannotBeStoredIsRolledBack) {
     create("L1", {named("Lessor", text("ACME")), named("LeaseTerm", uint32(12)),
                   named("RenewalOption", testsupport::boolean(true)),
                   named("BaseTermCommencementDate", testsupport::dateTime("20260101000000.000000+060"))});
@@ -163,46 +163,46 @@ TEST_F(StorageTest, ADeletionThatCannotBeStoredIsTakenBack) {
     EXPECT_THAT(modify("L2", {named("LeaseTerm", uint32(1))}), isDone()) << "the next change brings all";
     unload();
     EXPECT_THAT(identifiers(), ElementsAre("L2", "L3", "L1"));
-    EXPECT_EQ(valueIn(got("L1"), "Lessor"), "ACME");
+    EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "ACME");
     EXPECT_THAT(remove("L1"), isDone());
 }
 
-TEST_F(StorageTest, AFileThatStaysDamagedIsTold) {
+TEST_F(StorageTest, ADamagedFileIsReported) {
     create("L1", {named("Lessor", text("ACME"))});
     const FullDisk disk(10);
     EXPECT_THAT(modify("L1", {named("LeaseTerm", uint32(1))}),
                 isRefused(CMPI_RC_ERR_FAILED, "Lease.dat stays damaged until the next change succeeds"));
     EXPECT_THAT(create("L2"), isRefused(CMPI_RC_ERR_FAILED, "stays damaged"));
-    EXPECT_EQ(valueIn(got("L1"), "LeaseTerm"), "0");
+    EXPECT_EQ(valueIn(instanceOf("L1"), "LeaseTerm"), "0");
 }
 
-TEST_F(StorageTest, AFileThatWasNotWrittenIsTold) {
+TEST_F(StorageTest, AFileThatWasNotWrittenIsReported) {
     create("L1", {named("Lessor", text("ACME"))});
     const std::string stored = readFile(dataFile("Lease.dat"));
     for (const char* lessor : {"Other", ""}) {
-        const Openings none("-");
+        const OpenResults none("-");
         const Outcome outcome = modify("L1", {named("Lessor", text(lessor))});
         EXPECT_THAT(outcome, isRefused(CMPI_RC_ERR_FAILED, "Lease.dat was not written"));
         EXPECT_THAT(outcome.message, testing::Not(HasSubstr("damaged"))) << "it never changed";
-        EXPECT_EQ(valueIn(got("L1"), "Lessor"), "ACME");
+        EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "ACME");
     }
     EXPECT_EQ(readFile(dataFile("Lease.dat")), stored);
 }
 
-TEST_F(StorageTest, AFileThatWasNotWrittenIsToldAlsoWhereLossyValuesArePermitted) {
+TEST_F(StorageTest, AFileThatWasNotWrittenIsReportedEvenIfLossyValuesArePermitted) {
     const RefusalOff permitted;
     create("L1", {named("Lessor", text("A_B"))});
     EXPECT_THAT(modify("L1", {named("Lessor", text("A B"))}), isDone()) << "the same in the file";
-    const Openings none("-");
+    const OpenResults none("-");
     EXPECT_THAT(modify("L1", {named("Lessor", text("Other"))}),
                 isRefused(CMPI_RC_ERR_FAILED, "Lease.dat was not written"));
-    EXPECT_EQ(valueIn(got("L1"), "Lessor"), "A B");
+    EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "A B");
 }
 
-TEST_F(StorageTest, WhatTheFileKeepsOfAChangeThatIsTakenBackIsTold) {
+TEST_F(StorageTest, ARollBackThatTheFileDoesNotContainIsReported) {
     create("L1");
     {
-        const Openings first("+-");
+        const OpenResults first("+-");
         EXPECT_THAT(create("L2", {named("Lessor", text("ACME"))}),
                     isRefused(CMPI_RC_ERR_FAILED, "Lease.dat stays damaged until the next change succeeds"));
     }
@@ -212,34 +212,34 @@ TEST_F(StorageTest, WhatTheFileKeepsOfAChangeThatIsTakenBackIsTold) {
     EXPECT_THAT(readFile(dataFile("Lease.dat")), testing::Not(HasSubstr("L2\n")));
 }
 
-TEST_F(StorageTest, ADeletionThatIsTakenBackInPartIsTold) {
+TEST_F(StorageTest, APartialRollBackOfADeletionIsReported) {
     create("L1", {named("Lessor", text("ACME"))});
     {
-        const Openings second("-+-");
+        const OpenResults second("-+-");
         EXPECT_THAT(remove("L1"), isRefused(CMPI_RC_ERR_FAILED, "Lease.dat stays damaged until the next change"));
     }
-    EXPECT_EQ(valueIn(got("L1"), "Lessor"), "ACME") << "in memory";
+    EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "ACME") << "in memory";
     EXPECT_THAT(modify("L1", {named("LeaseTerm", uint32(1))}), isDone());
     EXPECT_THAT(readFile(dataFile("Lease.dat")), HasSubstr("ACME\n"));
 }
 
-TEST_F(StorageTest, AChangeToWhatTheFileHasAlreadyIsAChange) {
+TEST_F(StorageTest, AChangeToAValueThatTheFileAlreadyHasSucceeds) {
     create("L1", {named("Lessor", text("ACME"))});
     const auto byHand = std::regex_replace(readFile(dataFile("Lease.dat")), std::regex("ACME"), "Other");
     testsupport::writeFile(dataFile("Lease.dat"), byHand);
     fs::last_write_time(dataFile("Lease.dat"), fs::file_time_type::clock::now() - std::chrono::hours(1));
     EXPECT_THAT(modify("L1", {named("Lessor", text("Other"))}), isDone());
-    EXPECT_EQ(valueIn(got("L1"), "Lessor"), "Other");
+    EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "Other");
     EXPECT_EQ(readFile(dataFile("Lease.dat")), byHand);
 }
 
-TEST_F(StorageTest, WithoutRoomNothingIsTouched) {
+TEST_F(StorageTest, AFullFileSystemRefusesChangesBeforeWriting) {
     create("L1", {named("LeaseTerm", uint32(1))});
     const ObjectPath path = gate().enumerateInstanceNames(classPath(asset)).paths().front();
     const std::string stored = readFile(dataFile("Lease.dat"));
     const auto written = fs::last_write_time(dataFile("Lease.dat"));
     {
-        const NoRoom room;
+        const FullFileSystem room;
         EXPECT_THAT(create("L2"), isRefused(CMPI_RC_ERR_FAILED, "No space left"));
         EXPECT_THAT(modify("L1", {named("LeaseTerm", uint32(9))}), isRefused(CMPI_RC_ERR_FAILED, "No space left"));
         EXPECT_THAT(gate().modifyInstance(path, testsupport::instance(path, {named("AssetNumber", text("A1"))})),
@@ -251,7 +251,7 @@ TEST_F(StorageTest, WithoutRoomNothingIsTouched) {
     EXPECT_THAT(create("L2"), isAnswered(1));
 }
 
-TEST_F(StorageTest, AssetDataThatCannotBeStoredAreToldAndStayAsTheyWere) {
+TEST_F(StorageTest, AssetDataThatCannotBeStoredAreReportedAndUnchanged) {
     const ObjectPath path = gate().enumerateInstanceNames(classPath(asset)).paths().front();
     const auto change = [&](const std::string& number) {
         return gate().modifyInstance(path, testsupport::instance(path, {named("AssetNumber", text(number))}));
@@ -269,7 +269,7 @@ TEST_F(StorageTest, AssetDataThatCannotBeStoredAreToldAndStayAsTheyWere) {
     EXPECT_THAT(change("A2"), isDone());
 }
 
-TEST_F(StorageTest, ADamagedFileIsMadeWholeByTheNextChange) {
+TEST_F(StorageTest, TheNextChangeRepairsADamagedFile) {
     create("L1");
     testsupport::writeFile(dataFile("Lease.dat"), "7\nL1\n");
     EXPECT_THAT(create("L2"), isAnswered(1));
@@ -280,14 +280,14 @@ TEST_F(StorageTest, ADamagedFileIsMadeWholeByTheNextChange) {
 }  // namespace
 }  // namespace gatetest
 
-// In the place of the system's, also for the libraries under test.
+// Replace the C library's functions, also for the libraries under test.
 
 namespace {
 
-/** Opens a file, or says that there are too many open ones. */
+/** Opens a file, or fails with EMFILE. */
 FILE* openIfAllowed(const char* function, const char* path, const char* mode) {
     using Function = FILE* (*)(const char*, const char*);
-    if (*mode == 'w' && !gatetest::Openings::take()) {
+    if (*mode == 'w' && !gatetest::OpenResults::take()) {
         errno = EMFILE;
         return nullptr;
     }
@@ -307,7 +307,7 @@ extern "C" __attribute__((visibility("default"))) FILE* fopen64(const char* path
 extern "C" __attribute__((visibility("default"))) int statvfs(const char* path, struct statvfs* system) noexcept {
     static const auto real = reinterpret_cast<int (*)(const char*, struct statvfs*)>(dlsym(RTLD_NEXT, "statvfs"));
     const int answer = real(path, system);
-    if (gatetest::NoRoom::count > 0) {
+    if (gatetest::FullFileSystem::count > 0) {
         system->f_bfree = 0;
         system->f_bavail = 0;
     }

@@ -9,7 +9,7 @@ namespace gatetest {
 
 constexpr int clientCount = 32;
 
-/** Runs a body on many threads, which start together. */
+/** Runs a function on a number of threads that start together. */
 template <class Body>
 void onThreads(int count, Body body) {
     std::mutex mutex;

@@ -15,7 +15,7 @@ CMPIStatus refuse(const CMPIResult*, const CMPIObjectPath*) {
 
 class UnansweredCreationTest : public GateTest {
 protected:
-    /** Creates a lease "L1" through a result that refuses its path. */
+    /** Creates a lease "L1" with a result that refuses its path. */
     Outcome createUnanswered() {
         const ObjectPath path = keyedPath(lease, "L1");
         const Instance sent = testsupport::instance(path, {named("Lessor", text("ACME"))});
@@ -42,7 +42,7 @@ TEST_F(UnansweredCreationTest, IsRolledBack) {
 TEST_F(UnansweredCreationTest, LeavesTheIdentifierFree) {
     EXPECT_THAT(createUnanswered(), isRefused(CMPI_RC_ERR_FAILED, "object manager"));
     EXPECT_THAT(create("L1", {named("Lessor", text("Another"))}), isAnswered(1));
-    EXPECT_EQ(valueIn(got("L1"), "Lessor"), "Another");
+    EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "Another");
 }
 
 }  // namespace

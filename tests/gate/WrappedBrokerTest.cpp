@@ -14,7 +14,7 @@ using gate::WrappedBroker;
 bool isHeld = true;
 const WrappedBroker::Lock lock{[] { isHeld = false; }, [] { isHeld = true; }};
 
-/** An object manager's broker, which is more than the structure that providers know. */
+/** An object manager's broker, which has further members after the CMPI structure. */
 struct Manager : CMPIBroker {
     int calls = 0;
 };
@@ -37,7 +37,7 @@ struct Counting<slot, isService> {
     }
 };
 
-/** Fills a manager's slots, calls each through the wrapper, and expects it to arrive. */
+/** Fills a manager's slots, calls each through the wrapper, and expects that the manager receives the call. */
 template <bool isService, auto... slots, class Table>
 void expectForwarded(Table& managers, Manager& manager, Table* CMPIBroker::*table) {
     manager.*table = &managers;
@@ -50,7 +50,7 @@ void expectForwarded(Table& managers, Manager& manager, Table* CMPIBroker::*tabl
     manager.calls = 0;
 }
 
-/** Expects each slot that the manager lacks to be lacking. */
+/** Expects that each slot is null if the manager's is. */
 template <auto... slots, class Table>
 void expectMissing(Table* CMPIBroker::*table, Table& empty) {
     Manager manager{};

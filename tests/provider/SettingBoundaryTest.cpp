@@ -139,7 +139,8 @@ TYPED_TEST(MonikerBoundaryDeathTest, TerminatesOnANonstandardException) {
 }
 
 TYPED_TEST(MonikerBoundary, SkipsAKeyThatCannotBeSelected) {
-    monikers().keys = {{"Name", "unknown"}, {"Name", "testhost"}, {"InstanceID", "/nowhere"}, {"InstanceID", "/system"}};
+    monikers().keys = {
+        {"Name", "unknown"}, {"Name", "testhost"}, {"InstanceID", "/nowhere"}, {"InstanceID", "/system"}};
     monikers().selected = 0;
     monikers().unselectable = {0, 2};
     this->toElement();

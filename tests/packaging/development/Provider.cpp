@@ -18,7 +18,7 @@ CMPIStatus productCleanup(CMPIInstanceMI*, const CMPIContext*, CMPIBoolean) {
 }
 
 CMPIStatus productEnumInstanceNames(CMPIInstanceMI*, const CMPIContext*, const CMPIResult* result,
-                                  const CMPIObjectPath* path) {
+                                    const CMPIObjectPath* path) {
     const std::wstring name = KO::Product::getName();
     const std::string narrow(name.begin(), name.end());
     CMPIObjectPath* product = CMNewObjectPath(broker, "root/cimv2", "External_Product", nullptr);
@@ -30,22 +30,22 @@ CMPIStatus productEnumInstanceNames(CMPIInstanceMI*, const CMPIContext*, const C
 }
 
 CMPIStatus productEnumInstances(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*,
-                              const char**) {
+                                const char**) {
     return unsupported();
 }
 
 CMPIStatus productGetInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*,
-                            const char**) {
+                              const char**) {
     return unsupported();
 }
 
 CMPIStatus productCreateInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*,
-                               const CMPIInstance*) {
+                                 const CMPIInstance*) {
     return unsupported();
 }
 
 CMPIStatus productModifyInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*,
-                               const CMPIInstance*, const char**) {
+                                 const CMPIInstance*, const char**) {
     return unsupported();
 }
 
@@ -54,7 +54,7 @@ CMPIStatus productDeleteInstance(CMPIInstanceMI*, const CMPIContext*, const CMPI
 }
 
 CMPIStatus productExecQuery(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*, const char*,
-                          const char*) {
+                            const char*) {
     return unsupported();
 }
 

@@ -10,7 +10,7 @@
 #include "broker/RequestScope.h"
 #include "support/UnderTest.h"
 
-// The end of the object manager, of the process, and of the broker.
+// Shutdown of the object manager and the process, and destruction of the broker.
 
 namespace gatetest {
 namespace {
@@ -19,15 +19,15 @@ using testing::ElementsAre;
 using testing::IsEmpty;
 using testing::Not;
 
-/** A broker one of whose functions waits inside, for a test to look at what others do meanwhile. */
+/** A broker with a blocking function, so that a test can act while a request is in progress. */
 class WaitingBroker {
 public:
-    explicit WaitingBroker(const CMPIBroker& real) : services(*real.bft), makers(*real.eft), broker(real) {
+    explicit WaitingBroker(const CMPIBroker& real) : services(*real.bft), factories(*real.eft), broker(real) {
         original = real;
         services.enumerateInstances = &enumerateInstances;
-        makers.newInstance = &newInstance;
+        factories.newInstance = &newInstance;
         broker.bft = &services;
-        broker.eft = &makers;
+        broker.eft = &factories;
         current = this;
     }
     WaitingBroker(const WaitingBroker&) = delete;
@@ -46,7 +46,7 @@ public:
         changed.notify_all();
     }
 
-    std::function<void()> inUpCall;  ///< is run in the up-call, on its thread, in the place of waiting
+    std::function<void()> inUpCall;  // /< runs in the up-call, on its thread, instead of waiting
 
 private:
     void wait() {
@@ -79,52 +79,52 @@ private:
     bool hasArrived = false;
     bool isReleased = false;
     CMPIBrokerFT services;
-    CMPIBrokerEncFT makers;
+    CMPIBrokerEncFT factories;
     CMPIBroker broker;
 };
 
-class EndTest : public GateTest {
+class ShutdownTest : public GateTest {
 protected:
-    /** Goes on when the gate refuses requests: one that is wrong anyway is refused for another reason then. */
+    /** Waits until the gate refuses requests. An invalid request is then refused with another status. */
     void awaitRefusal() {
         while (gate().getInstance(classPath("VELKO_Unserved")).rc != CMPI_RC_ERR_FAILED) {  // needs no lock
             std::this_thread::yield();
         }
     }
 
-    /** Ends the manager while a request waits in the broker, which then goes on. */
-    void endDuring(
+    /** Shuts the manager down while a request waits in the broker, then lets the request continue. */
+    void shutDownDuring(
         WaitingBroker& waiting, const std::function<void()>& ask, const std::function<void()>& meanwhile = [] {}) {
         std::thread request(ask);
         waiting.awaitArrival();
-        std::thread end([&] {
+        std::thread shutdown([&] {
             EXPECT_THAT(gate().cleanupInstanceMI(true), isDone());
             broker.forget();
         });
         awaitRefusal();
         meanwhile();
         waiting.release();
-        end.join();
+        shutdown.join();
         request.join();
-        EXPECT_THAT(broker.functions(), IsEmpty()) << "after the end";
+        EXPECT_THAT(broker.functions(), IsEmpty()) << "after the shutdown";
     }
 
-    /** Ends the process: with 0 if all goes as it should. */
-    [[noreturn]] void outlastTheEnd(bool isOpenedAgain) {
-        create(firstPlace);
+    /** Exits with 0 if a request whose up-call outlasts the shutdown is refused. */
+    [[noreturn]] void outlastShutdown(bool isReopened) {
+        create(firstNode);
         WaitingBroker waiting(*broker.handle());
         gate().createInstanceMI(waiting.handle(), nullptr);
         gate().createAssociationMI(waiting.handle(), nullptr);
         std::thread request([&] {
-            EXPECT_THAT(gate().associatorNames(keyedPath(lease, firstPlace), {}),
+            EXPECT_THAT(gate().associatorNames(keyedPath(lease, firstNode), {}),
                         isRefused(CMPI_RC_ERR_FAILED, "shutting down"));
         });
         waiting.awaitArrival();
         EXPECT_THAT(gate().cleanupInstanceMI(true), isDone());
-        std::optional<testsupport::RecordingBroker> next;  // which then records for both
-        if (isOpenedAgain) {
+        std::optional<testsupport::RecordingBroker> next;  // records the calls of both
+        if (isReopened) {
             EXPECT_NE(gate().createInstanceMI(next.emplace().handle(), nullptr), nullptr);
-            EXPECT_THAT(identifiers(), ElementsAre(firstPlace)) << "the next manager is served";
+            EXPECT_THAT(identifiers(), ElementsAre(firstNode)) << "requests of the next manager";
         }
         testsupport::RecordingBroker& latest = next ? *next : broker;
         latest.forget();
@@ -132,7 +132,8 @@ protected:
         request.join();
         EXPECT_THAT(latest.functions(), ElementsAre("CMPIBrokerFT.enumerateInstances")) << "the up-call itself";
         close();
-        EXPECT_TRUE(isLoaded(testsupport::underTest(GATE_LIBRARY))) << "a request may still have been in it";
+        EXPECT_TRUE(isLoaded(testsupport::underTest(GATE_LIBRARY)))
+            << "the library stays loaded, since a request may still use it";
         std::_Exit(testing::Test::HasFailure() ? 1 : 0);
     }
 
@@ -145,22 +146,22 @@ protected:
     }
 };
 
-TEST_F(EndTest, AfterTheManagersEndRequestsAreRefusedWithoutACallOfItsBroker) {
+TEST_F(ShutdownTest, RefusesRequestsAfterShutdownWithoutCallingTheBroker) {
     create("L1");
     gate().associationMI();
     EXPECT_THAT(gate().cleanupInstanceMI(true), isDone());
     EXPECT_THAT(gate().cleanupAssociationMI(true), isDone());
     broker.forget();
-    const auto isRefusedForTheEnd = isRefused(CMPI_RC_ERR_FAILED, "shutting down");
-    EXPECT_THAT(gate().enumerateInstances(classPath(lease)), isRefusedForTheEnd);
-    EXPECT_THAT(create("L2"), isRefusedForTheEnd);
-    EXPECT_THAT(gate().associatorNames(keyedPath(lease, "L1"), {}), isRefusedForTheEnd);
+    const auto isRefusedAfterShutdown = isRefused(CMPI_RC_ERR_FAILED, "shutting down");
+    EXPECT_THAT(gate().enumerateInstances(classPath(lease)), isRefusedAfterShutdown);
+    EXPECT_THAT(create("L2"), isRefusedAfterShutdown);
+    EXPECT_THAT(gate().associatorNames(keyedPath(lease, "L1"), {}), isRefusedAfterShutdown);
     EXPECT_THAT(gate().execQuery(classPath(lease), "WQL", "select"), isRefused(CMPI_RC_ERR_NOT_SUPPORTED, "queries"));
     EXPECT_THAT(gate().cleanupInstanceMI(false), isRefused(CMPI_RC_DO_NOT_UNLOAD, "memory"));
     EXPECT_THAT(broker.functions(), IsEmpty());
 }
 
-TEST_F(EndTest, AManagerThatGoesOnOpensTheGateByAFactory) {
+TEST_F(ShutdownTest, AcceptsRequestsAfterTheNextFactoryCall) {
     create("L1");
     gate().cleanupInstanceMI(true);
     CMPIStatus status{CMPI_RC_ERR_FAILED, nullptr};
@@ -169,7 +170,7 @@ TEST_F(EndTest, AManagerThatGoesOnOpensTheGateByAFactory) {
     EXPECT_THAT(identifiers(), ElementsAre("L1"));
 }
 
-TEST_F(EndTest, TheProviderIsToldOnceAnEnd) {
+TEST_F(ShutdownTest, CleansUpTheProviderOncePerShutdown) {
     gate().instanceMI();
     gate().associationMI();
     agentEnvironment::forgetLog();
@@ -181,51 +182,52 @@ TEST_F(EndTest, TheProviderIsToldOnceAnEnd) {
     EXPECT_EQ(cleanups("LeaseAndWarranty_AssociationCleanup"), 1);
 }
 
-TEST_F(EndTest, TheManagersEndWaitsForRequestsAndNoneCallsItsBrokerAfterIt) {
+TEST_F(ShutdownTest, ShutdownWaitsForRequestsAndNoneCallsTheBrokerAfterwards) {
     create("L1");
     WaitingBroker waiting(*broker.handle());
     gate().createInstanceMI(waiting.handle(), nullptr);
-    endDuring(waiting, [&] { EXPECT_THAT(gate().enumerateInstances(classPath(lease)), isAnswered(1)); });
-    unload();  // before the other broker goes
+    shutDownDuring(waiting, [&] { EXPECT_THAT(gate().enumerateInstances(classPath(lease)), isAnswered(1)); });
+    unload();  // before the other broker is destroyed
 }
 
-TEST_F(EndTest, ARequestInAnUpCallIsServedWhenTheManagerEnds) {
-    create(firstPlace);
+TEST_F(ShutdownTest, CompletesARequestThatIsInAnUpCall) {
+    create(firstNode);
     WaitingBroker waiting(*broker.handle());
     gate().createInstanceMI(waiting.handle(), nullptr);
     gate().createAssociationMI(waiting.handle(), nullptr);
-    endDuring(waiting, [&] { EXPECT_THAT(gate().associatorNames(keyedPath(lease, firstPlace), {}), isAnswered(1)); });
+    shutDownDuring(waiting,
+                   [&] { EXPECT_THAT(gate().associatorNames(keyedPath(lease, firstNode), {}), isAnswered(1)); });
     unload();
 }
 
-/** In processes of their own, since the library stays in them. Both wait as long as the gate has patience. */
-TEST_F(EndTest, ARequestWhoseUpCallOutlastsTheEndIsRefusedWithoutACallOfTheBroker) {
+/** In separate processes, since the library stays loaded. Both wait until the drain timeout. */
+TEST_F(ShutdownTest, RefusesARequestWhoseUpCallOutlastsTheShutdown) {
     testing::FLAGS_gtest_death_test_style = "threadsafe";
-    EXPECT_EXIT(outlastTheEnd(false), testing::ExitedWithCode(0), "");
+    EXPECT_EXIT(outlastShutdown(false), testing::ExitedWithCode(0), "");
 }
 
-TEST_F(EndTest, ARequestWhoseUpCallOutlastsTheEndIsRefusedAlsoAfterTheNextManagerHasCome) {
+TEST_F(ShutdownTest, RefusesARequestWhoseUpCallOutlastsTheShutdownEvenIfANewManagerIsConnected) {
     testing::FLAGS_gtest_death_test_style = "threadsafe";
-    EXPECT_EXIT(outlastTheEnd(true), testing::ExitedWithCode(0), "");
+    EXPECT_EXIT(outlastShutdown(true), testing::ExitedWithCode(0), "");
 }
 
-TEST_F(EndTest, AFactoryWhileTheManagerEndsGivesNothingAndSaysWhy) {
-    create(firstPlace);
+TEST_F(ShutdownTest, AFactoryCallDuringShutdownFailsWithAMessage) {
+    create(firstNode);
     WaitingBroker waiting(*broker.handle());
     gate().createInstanceMI(waiting.handle(), nullptr);
     const auto enumerate = [&] { EXPECT_THAT(gate().enumerateInstances(classPath(lease)), isAnswered(1)); };
-    endDuring(waiting, enumerate, [&] {
+    shutDownDuring(waiting, enumerate, [&] {
         CMPIStatus status{CMPI_RC_OK, nullptr};
         EXPECT_EQ(gate().createInstanceMI(waiting.handle(), &status), nullptr);
         EXPECT_EQ(status.rc, CMPI_RC_ERR_FAILED);
         EXPECT_THAT(cimhost::statusFrom(status).message, testing::HasSubstr("shutting down"));
     });
-    EXPECT_NE(gate().createInstanceMI(broker.handle(), nullptr), nullptr) << "the manager goes on";
-    EXPECT_THAT(identifiers(), ElementsAre(firstPlace));
+    EXPECT_NE(gate().createInstanceMI(broker.handle(), nullptr), nullptr) << "after the shutdown";
+    EXPECT_THAT(identifiers(), ElementsAre(firstNode));
     unload();
 }
 
-TEST_F(EndTest, ABrokerWithOtherTablesIsConnectedAnew) {
+TEST_F(ShutdownTest, UsesTheNewTablesOfABroker) {
     create("L1");
     CMPIBrokerEncFT fewer = *broker.handle()->eft;
     fewer.newInstance = nullptr;
@@ -236,13 +238,14 @@ TEST_F(EndTest, ABrokerWithOtherTablesIsConnectedAnew) {
     changing.eft = broker.handle()->eft;
     gate().createInstanceMI(&changing, nullptr);
     EXPECT_THAT(gate().enumerateInstances(classPath(lease)), isAnswered(1));
-    unload();  // before the other broker goes
+    unload();  // before the other broker is destroyed
 }
 
-/** Ends the process from the thread of an up-call while the request waits for it; with 8 if the gate lets it end. */
-struct EndInUpCall {
+/** Exits from another thread during an up-call, while the request waits; with 8 if the gate does not block that. */
+struct ExitInUpCall {
     static void run() {
-        // After the gate's static objects. Leaks are not looked for then: the search stumbles over the other threads.
+        // Runs after the gate's static objects are destroyed. Skips the leak check, which does not support the other
+        // threads.
         std::atexit([] { std::_Exit(8); });
         static auto& broker = *new testsupport::RecordingBroker;
         static auto& waiting = *new WaitingBroker(*broker.handle());
@@ -250,13 +253,13 @@ struct EndInUpCall {
             new testsupport::ProviderLibrary(testsupport::underTest(GATE_LIBRARY), "LeaseAndWarrantyGate", broker);
         waiting.inUpCall = [] { std::thread([] { std::exit(0); }).join(); };
         library->createAssociationMI(waiting.handle(), nullptr);
-        library->associatorNames(keyedPath(lease, firstPlace), {});
+        library->associatorNames(keyedPath(lease, firstNode), {});
     }
 };
 
-TEST_F(EndTest, TheProcessMayEndFromTheThreadOfAnUpCall) {
+TEST_F(ShutdownTest, TheProcessCanExitFromAThreadOfAnUpCall) {
     testing::FLAGS_gtest_death_test_style = "threadsafe";
-    EXPECT_EXIT(EndInUpCall::run(), testing::ExitedWithCode(8), "");
+    EXPECT_EXIT(ExitInUpCall::run(), testing::ExitedWithCode(8), "");
 }
 
 }  // namespace

@@ -1,4 +1,4 @@
-#include "Shown.h"
+#include "Formatting.h"
 
 #include <algorithm>
 #include <sstream>
@@ -14,7 +14,7 @@ using cimhost::ProviderResponse;
 
 struct RecordFile {
     const char* name;
-    const char* empty;  ///< a record as new, but for its identifier
+    const char* empty;  // /< a record with initial values, without its identifier
 };
 
 constexpr RecordFile recordFiles[] = {
@@ -28,20 +28,20 @@ std::string contentOf(const std::string& name) {
     return std::filesystem::exists(file) ? testsupport::readFile(file) : "";
 }
 
-std::string shown(const cimhost::Value& value) {
+std::string formatted(const cimhost::Value& value) {
     if (!value.isNull && value.elements.size() == 1) {
         const cimhost::Scalar& only = value.elements.front();
         if (const auto* characters = std::get_if<std::string>(&only)) {
             return *characters;
         }
         if (const auto* path = std::get_if<std::shared_ptr<const ObjectPath>>(&only)) {
-            return gatetest::shown(**path);
+            return gatetest::formatted(**path);
         }
     }
     return cimhost::formatMof(value);
 }
 
-/** The paths of the results, whatever their kind. */
+/** Returns the paths of the results, which are paths or instances. */
 std::vector<ObjectPath> pathsOf(const cimhost::Response& response) {
     std::vector<ObjectPath> paths = response.paths;
     for (const Instance& instance : response.instances) {
@@ -55,8 +55,10 @@ bool isProvidersFailure(const cimhost::Response& response) {
                        [](const ProviderResponse& each) { return !each.status.ok(); });
 }
 
-/** The records of a file: identifier and first text, blanks for underscores, whatever the number of lines says. */
-std::string shownRecords(const std::string& content, const RecordFile& file) {
+/**
+ * Formats the records of a file, regardless of its count: identifier and first string, with blanks for underscores.
+ */
+std::string formattedRecords(const std::string& content, const RecordFile& file) {
     const std::string empty = file.empty;
     const auto lines = 1 + std::count(empty.begin(), empty.end(), '\n');
     std::istringstream stream(content);
@@ -76,17 +78,17 @@ std::string shownRecords(const std::string& content, const RecordFile& file) {
 
 }  // namespace
 
-std::string shown(const ObjectPath& path) {
+std::string formatted(const ObjectPath& path) {
     const std::string prefix = "VELKO_";
     const bool isOurs = path.className.compare(0, prefix.size(), prefix) == 0;
     std::string text = (isOurs ? path.className.substr(prefix.size()) : path.className) + "[";
     for (const NamedValue& key : path.keys) {
-        text += (&key == path.keys.data() ? "" : ",") + shown(key.value);
+        text += (&key == path.keys.data() ? "" : ",") + formatted(key.value);
     }
     return text + "]";
 }
 
-std::string shown(const cimhost::Response& response) {
+std::string formatted(const cimhost::Response& response) {
     if (!response.crashReason().empty()) {
         return "died";
     }
@@ -95,7 +97,7 @@ std::string shown(const cimhost::Response& response) {
     }
     std::string text;
     for (const ObjectPath& path : pathsOf(response)) {
-        text += (text.empty() ? "" : " ") + shown(path);
+        text += (text.empty() ? "" : " ") + formatted(path);
     }
     return text;
 }
@@ -118,7 +120,7 @@ std::string DataFiles::changes() const {
         }
         notes += "; " + name;
         for (const RecordFile& file : recordFiles) {
-            notes += name == file.name ? ":" + shownRecords(now, file) : "";
+            notes += name == file.name ? ":" + formattedRecords(now, file) : "";
         }
     }
     return notes;

@@ -11,12 +11,12 @@
 #include <thread>
 #include <vector>
 
-// What tests of the gate's lock wait for.
+// Helpers of the tests of the request lock.
 
 namespace gatetest {
 
-/** Events in the order in which they happen, and a way to wait for one. */
-class Diary {
+/** Events in order of occurrence. A thread can wait for an event. */
+class EventLog {
 public:
     void note(const std::string& event) {
         const std::lock_guard<std::mutex> lock(mutex);
@@ -43,7 +43,7 @@ private:
 /** A timeout that no test reaches. */
 constexpr std::chrono::hours longEnough{1};
 
-/** Waits until that many threads wait for the lock. */
+/** Waits until that number of threads waits for the lock. */
 inline void awaitQueue(const gate::RequestLock& lock, std::size_t length) {
     while (lock.waiting() < length) {
         std::this_thread::yield();
