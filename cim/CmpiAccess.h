@@ -32,7 +32,7 @@ auto ask(Object* object, Arguments... arguments) {
     return Answer<Value>{value, status};
 }
 
-/** Calls one of the broker's functions that create objects. Returns null if the status is an error. */
+/** Calls a function of an object's table that returns its status. */
 template <auto function, class Object, class... Arguments>
 CMPIStatus tell(Object* object, Arguments... arguments) {
     if (object == nullptr || object->ft == nullptr || object->ft->*function == nullptr) {
@@ -41,7 +41,7 @@ CMPIStatus tell(Object* object, Arguments... arguments) {
     return (object->ft->*function)(object, arguments...);
 }
 
-/** Calls one of the broker's functions that create objects. Null when the status is an error. */
+/** Calls one of the broker's functions that create objects. Returns null if the status is an error. */
 template <auto function, class... Arguments>
 auto make(const CMPIBroker* broker, Arguments... arguments) {
     CMPIStatus status{CMPI_RC_OK, nullptr};
@@ -76,6 +76,49 @@ inline std::optional<std::string> charactersOf(const CMPIString* string) {
 inline bool hasValue(const CMPIData& data) {
     constexpr unsigned int flaws = CMPI_nullValue | CMPI_notFound | CMPI_badValue;
     return (data.state & flaws) == 0 && data.type != CMPI_null;
+}
+
+/** Returns the decimal digits of an integer of any type; none for another type. Ignores the state. */
+inline std::optional<std::string> digitsOf(const CMPIData& data) {
+    switch (data.type) {
+        case CMPI_uint8:
+            return std::to_string(data.value.uint8);
+        case CMPI_uint16:
+            return std::to_string(data.value.uint16);
+        case CMPI_uint32:
+            return std::to_string(data.value.uint32);
+        case CMPI_uint64:
+            return std::to_string(data.value.uint64);
+        case CMPI_sint8:
+            return std::to_string(data.value.sint8);
+        case CMPI_sint16:
+            return std::to_string(data.value.sint16);
+        case CMPI_sint32:
+            return std::to_string(data.value.sint32);
+        case CMPI_sint64:
+            return std::to_string(data.value.sint64);
+        default:
+            return std::nullopt;
+    }
+}
+
+/**
+ * Returns the characters of a string or datetime, the digits of an integer, "true" or "false" of a boolean. None for
+ * another type, and for a null pointer. Ignores the state.
+ */
+inline std::optional<std::string> charactersOf(const CMPIData& data) {
+    switch (data.type) {
+        case CMPI_chars:
+            return data.value.chars == nullptr ? std::nullopt : std::optional<std::string>(data.value.chars);
+        case CMPI_string:
+            return charactersOf(data.value.string);
+        case CMPI_dateTime:
+            return charactersOf(ask<&CMPIDateTimeFT::getStringFormat>(data.value.dateTime).value);
+        case CMPI_boolean:
+            return data.value.boolean != 0 ? "true" : "false";
+        default:
+            return digitsOf(data);
+    }
 }
 
 /** Returns the instance of an enumeration element, regardless of its state; null if the element is not an instance. */

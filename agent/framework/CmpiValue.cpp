@@ -1,6 +1,7 @@
 #include "framework/CmpiValue.h"
 
-#include <limits>
+#include <charconv>
+#include <system_error>
 
 namespace KO {
 
@@ -10,66 +11,23 @@ bool isPresent(const CMPIData& data, const CMPIStatus& status, CMPIType type) {
     return status.rc == CMPI_RC_OK && cim::hasValue(data) && data.type == type;
 }
 
-struct Integer {
-    CMPIUint64 distance;  ///< from zero
-    bool negative;
-
-    std::string text() const { return (negative ? "-" : "") + std::to_string(distance); }
-};
-
-Integer integer(long long number) {
-    const auto bits = static_cast<CMPIUint64>(number);
-    return number < 0 ? Integer{0 - bits, true} : Integer{bits, false};
-}
-
-std::optional<Integer> integerOf(const CMPIData& data, const CMPIStatus& status) {
-    if (!isPresent(data, status, data.type)) {
-        return std::nullopt;
-    }
-    switch (data.type) {
-        case CMPI_uint8:
-            return Integer{data.value.uint8, false};
-        case CMPI_uint16:
-            return Integer{data.value.uint16, false};
-        case CMPI_uint32:
-            return Integer{data.value.uint32, false};
-        case CMPI_uint64:
-            return Integer{data.value.uint64, false};
-        case CMPI_sint8:
-            return integer(data.value.sint8);
-        case CMPI_sint16:
-            return integer(data.value.sint16);
-        case CMPI_sint32:
-            return integer(data.value.sint32);
-        case CMPI_sint64:
-            return integer(data.value.sint64);
-        default:
-            return std::nullopt;
-    }
-}
-
 }  // namespace
 
 std::optional<std::string> textOf(const CMPIData& data, const CMPIStatus& status) {
-    if (isPresent(data, status, CMPI_chars) && data.value.chars != nullptr) {
-        return data.value.chars;
-    }
-    return isPresent(data, status, CMPI_string) ? cim::charactersOf(data.value.string) : std::nullopt;
+    const bool isString = isPresent(data, status, CMPI_string) || isPresent(data, status, CMPI_chars);
+    return isString ? cim::charactersOf(data) : std::nullopt;
 }
 
 std::optional<std::string> dateTimeTextOf(const CMPIData& data, const CMPIStatus& status) {
-    if (!isPresent(data, status, CMPI_dateTime)) {
-        return std::nullopt;
-    }
-    return cim::charactersOf(cim::ask<&CMPIDateTimeFT::getStringFormat>(data.value.dateTime).value);
+    return isPresent(data, status, CMPI_dateTime) ? cim::charactersOf(data) : std::nullopt;
 }
 
 std::optional<unsigned int> numberOf(const CMPIData& data, const CMPIStatus& status) {
-    const std::optional<Integer> number = integerOf(data, status);
-    if (!number || number->negative || number->distance > std::numeric_limits<unsigned int>::max()) {
-        return std::nullopt;
-    }
-    return static_cast<unsigned int>(number->distance);
+    const auto digits = isPresent(data, status, data.type) ? cim::digitsOf(data) : std::nullopt;
+    unsigned int number = 0;
+    const bool fits =
+        digits && std::from_chars(digits->data(), digits->data() + digits->size(), number).ec == std::errc();
+    return fits ? std::optional<unsigned int>(number) : std::nullopt;
 }
 
 std::optional<bool> flagOf(const CMPIData& data, const CMPIStatus& status) {
@@ -77,13 +35,8 @@ std::optional<bool> flagOf(const CMPIData& data, const CMPIStatus& status) {
 }
 
 std::optional<std::string> keyTextOf(const CMPIData& data, const CMPIStatus& status) {
-    if (const std::optional<Integer> number = integerOf(data, status)) {
-        return number->text();
-    }
-    if (const std::optional<bool> flag = flagOf(data, status)) {
-        return *flag ? "true" : "false";
-    }
-    return textOf(data, status);
+    const bool isKeyType = data.type != CMPI_dateTime && isPresent(data, status, data.type);
+    return isKeyType ? cim::charactersOf(data) : std::nullopt;
 }
 
 CMPIObjectPath* referenceOf(const CMPIData& data, const CMPIStatus& status) {

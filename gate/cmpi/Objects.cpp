@@ -1,8 +1,7 @@
 #include "Objects.h"
 
 #include <charconv>
-#include <cstdint>
-#include <limits>
+#include <system_error>
 
 namespace gate {
 
@@ -62,39 +61,6 @@ CMPIInstance* makeInstance(const CMPIBroker* broker, const CMPIObjectPath* path)
 
 namespace {
 
-/** Converts a value by its own type; none for a type that no class here has. */
-std::optional<std::string> charactersOf(const CMPIData& data) {
-    const CMPIValue& value = data.value;
-    switch (data.type) {
-        case CMPI_chars:
-            return value.chars == nullptr ? std::nullopt : std::optional<std::string>(value.chars);
-        case CMPI_string:
-            return cim::charactersOf(value.string);
-        case CMPI_dateTime:
-            return cim::charactersOf(ask<&CMPIDateTimeFT::getStringFormat>(value.dateTime).value);
-        case CMPI_boolean:
-            return value.boolean != 0 ? "true" : "false";
-        case CMPI_uint8:
-            return std::to_string(value.uint8);
-        case CMPI_uint16:
-            return std::to_string(value.uint16);
-        case CMPI_uint32:
-            return std::to_string(value.uint32);
-        case CMPI_uint64:
-            return std::to_string(value.uint64);
-        case CMPI_sint8:
-            return std::to_string(value.sint8);
-        case CMPI_sint16:
-            return std::to_string(value.sint16);
-        case CMPI_sint32:
-            return std::to_string(value.sint32);
-        case CMPI_sint64:
-            return std::to_string(value.sint64);
-        default:
-            return std::nullopt;
-    }
-}
-
 bool isString(CMPIType type) {
     return type == CMPI_string || type == CMPI_chars;
 }
@@ -117,20 +83,19 @@ bool isConvertible(CMPIType given, CMPIType wanted) {
     }
 }
 
-std::optional<std::uint32_t> numberIn(const std::string& digits) {
-    std::uint32_t number = 0;
-    const char* end = digits.data() + digits.size();
-    const auto [last, error] = std::from_chars(digits.data(), end, number);
-    return error == std::errc() && last == end ? std::optional<std::uint32_t>(number) : std::nullopt;
+/** The number that the digits represent; none if it is out of the range of its type. */
+template <class Number>
+std::optional<Number> numberIn(const std::string& digits) {
+    Number number = 0;
+    const auto error = std::from_chars(digits.data(), digits.data() + digits.size(), number).ec;
+    return error == std::errc() ? std::optional<Number>(number) : std::nullopt;
 }
 
 /** Whether an integer is in the range of its type; true for other types. */
 bool fits(const std::string& characters, CMPIType wanted) {
-    if (wanted != CMPI_uint32 && wanted != CMPI_uint16) {
-        return true;
-    }
-    const auto number = numberIn(characters);
-    return number && (wanted == CMPI_uint32 || *number <= std::numeric_limits<std::uint16_t>::max());
+    return wanted == CMPI_uint32   ? numberIn<CMPIUint32>(characters).has_value()
+           : wanted == CMPI_uint16 ? numberIn<CMPIUint16>(characters).has_value()
+                                   : true;
 }
 
 void add(CMPIObjectPath* path, const char* name, const CMPIValue* value, CMPIType type) {
@@ -156,7 +121,7 @@ std::optional<std::string> convert(const CMPIData& data, const CMPIStatus& statu
     if (!isConvertible(data.type, property.type)) {
         fail(CMPI_RC_ERR_TYPE_MISMATCH, std::string(property.name) + ": the value has another type than the property.");
     }
-    auto characters = charactersOf(data);
+    auto characters = cim::charactersOf(data);
     if (characters && !fits(*characters, property.type)) {
         fail(CMPI_RC_ERR_TYPE_MISMATCH,
              std::string(property.name) + ": " + *characters + " is out of the range of the property's type.");
@@ -189,7 +154,7 @@ std::optional<std::string> keyOf(const CMPIObjectPath* path, const Property& pro
     const auto answer = ask<&CMPIObjectPathFT::getKey>(path, property.name);
     const bool isUsable =
         answer.isOk() && cim::hasValue(answer.value) && isConvertible(answer.value.type, property.type);
-    return isUsable ? charactersOf(answer.value) : std::nullopt;
+    return isUsable ? cim::charactersOf(answer.value) : std::nullopt;
 }
 
 CMPIObjectPath* referenceOf(const CMPIObjectPath* path, const char* key) {
@@ -203,9 +168,9 @@ CMPIValue scalarFrom(const std::string& characters, CMPIType type) {
     if (type == CMPI_boolean) {
         value.boolean = characters == "true" ? 1 : 0;
     } else if (type == CMPI_uint16) {
-        value.uint16 = static_cast<CMPIUint16>(numberIn(characters).value_or(0));
+        value.uint16 = numberIn<CMPIUint16>(characters).value_or(0);
     } else {
-        value.uint32 = numberIn(characters).value_or(0);
+        value.uint32 = numberIn<CMPIUint32>(characters).value_or(0);
     }
     return value;
 }

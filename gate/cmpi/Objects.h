@@ -59,9 +59,6 @@ CMPIInstance* makeInstance(const CMPIBroker* broker, const CMPIObjectPath* path)
 /** Values of properties, each property once. */
 using Values = std::vector<std::pair<const Property*, std::string>>;
 
-/** The datetime that the provider writes where there is no date. */
-constexpr const char* noDate = "00000000000000.000000-000";
-
 /**
  * Reads a property of an instance. None if it is absent or null. Fails with CMPI_RC_ERR_TYPE_MISMATCH if the value has
  * another type or is too large, and if the object manager cannot read it.

@@ -6,10 +6,6 @@ namespace gate {
 
 namespace {
 
-char lower(char letter) {
-    return letter >= 'A' && letter <= 'Z' ? static_cast<char>(letter - 'A' + 'a') : letter;
-}
-
 template <class Range>
 auto findNamed(const Range& range, std::string_view name) {
     const auto found =
@@ -18,11 +14,6 @@ auto findNamed(const Range& range, std::string_view name) {
 }
 
 }  // namespace
-
-bool sameName(std::string_view left, std::string_view right) {
-    return std::equal(left.begin(), left.end(), right.begin(), right.end(),
-                      [](char one, char other) { return lower(one) == lower(other); });
-}
 
 const Class* findClass(std::string_view name) {
     return findNamed(Classes(), name);

@@ -1,11 +1,15 @@
 #pragma once
 
+#include "cim/Names.h"
+
 #include <cmpidt.h>
 
 #include <cstddef>
 #include <string_view>
 
 namespace gate {
+
+using cim::sameName;
 
 /** A property or reference of a class. */
 struct Property {
@@ -35,9 +39,6 @@ struct Classes {
 
 /** The class of computers. Another provider serves it; each association has a computer at one end. */
 constexpr const char* computerClass = "VELKO_ComputerSystem";
-
-/** Compares names of CIM, in which letter case does not count. */
-bool sameName(std::string_view left, std::string_view right);
 
 /** The class of that name; null for one that the MOF does not declare. */
 const Class* findClass(std::string_view name);

@@ -188,7 +188,7 @@ std::vector<Traversal> traversalsFrom(const Request& request, const AssociationF
     return traversals;
 }
 
-/** Calls `take(session, traversal, pairs)` with the pairs at the request's path, in one session. */
+/** Calls `take(session, traversal, pair)` for each pair at the request's path, in one session. */
 template <class Take>
 void traverse(const Request& request, const AssociationFilter& filter, Take take) {
     if (keyCountOf(request.path) == 0) {
@@ -201,22 +201,22 @@ void traverse(const Request& request, const AssociationFilter& filter, Take take
     ProviderSession session(request);
     const std::vector<Computer> computers = knownComputers(request, session);
     for (const Traversal& traversal : traversals) {
-        Pairs pairs = pairsOf(session, computers, *traversal.association);
-        const auto isElsewhere = [&](const auto& pair) {
-            return !samePath(pathAt(*traversal.source, pair), request.path);
-        };
-        pairs.erase(std::remove_if(pairs.begin(), pairs.end(), isElsewhere), pairs.end());
-        take(session, traversal, pairs);
+        for (const AssociationPair& pair : pairsOf(session, computers, *traversal.association)) {
+            if (samePath(pathAt(*traversal.source, pair), request.path)) {
+                take(session, traversal, pair);
+            }
+        }
     }
 }
 
-/** Removes the answers that are not of the result class. */
+/** Returns the answers that are of the result class. */
 template <class Answer, class PathOf>
-void restrict(const Request& request, const char* resultClass, std::vector<Answer>& answers, PathOf pathOfAnswer) {
+void giveOfClass(const Request& request, const char* resultClass, std::vector<Answer>& answers, PathOf pathOfAnswer) {
     const auto isOther = [&](Answer answer) {
         return !isAny(resultClass) && !isA(request, pathOfAnswer(answer), resultClass);
     };
     answers.erase(std::remove_if(answers.begin(), answers.end(), isOther), answers.end());
+    request.give(answers);
 }
 
 const CMPIObjectPath* associationPath(const Request& request, const Class& association, const AssociationPair& pair) {
@@ -236,30 +236,26 @@ const CMPIInstance* associationInstance(const Request& request, const Class& ass
     return instance;
 }
 
-/** Makes an answer of a pair of an association. */
-template <class Made>
-using Maker = const Made* (*)(const Request&, const Class&, const AssociationPair&);
-
-/** Makes an answer of each pair of an association. */
-template <class Made>
-std::vector<const Made*> allOf(const Request& request, const Class& association, Maker<Made> make) {
-    ProviderSession session(request);
-    std::vector<const Made*> answers;
-    for (const AssociationPair& pair : pairsOf(session, knownComputers(request, session), association)) {
-        answers.push_back(make(request, association, pair));
+/** Returns what `make` makes of all pairs of an association. */
+template <class Make>
+void giveAll(const Request& request, const Class& association, Make make) {
+    std::vector<decltype(make(request, association, AssociationPair{}))> answers;
+    {
+        ProviderSession session(request);
+        for (const AssociationPair& pair : pairsOf(session, knownComputers(request, session), association)) {
+            answers.push_back(make(request, association, pair));
+        }
     }
-    return answers;
+    request.give(answers);
 }
 
-/** Makes an answer of each association at the request's path. */
-template <class Made>
-void giveReferences(const Request& request, const char* associationClass, const char* role, Maker<Made> make) {
-    std::vector<const Made*> answers;
+/** Returns what `make` makes of the pairs of all associations at the request's path. */
+template <class Make>
+void giveReferences(const Request& request, const char* associationClass, const char* role, Make make) {
+    std::vector<decltype(make(request, Class{}, AssociationPair{}))> answers;
     traverse(request, {associationClass, role, nullptr},
-             [&](const ProviderSession&, const Traversal& traversal, const Pairs& pairs) {
-                 for (const AssociationPair& pair : pairs) {
-                     answers.push_back(make(request, *traversal.association, pair));
-                 }
+             [&](const ProviderSession&, const Traversal& traversal, const AssociationPair& pair) {
+                 answers.push_back(make(request, *traversal.association, pair));
              });
     request.give(answers);
 }
@@ -286,33 +282,26 @@ void associators(const Request& request, const char* associationClass, const cha
                  const char* resultRole, const char** properties) {
     std::vector<const CMPIInstance*> answers;
     traverse(request, {associationClass, role, resultRole},
-             [&](const ProviderSession& session, const Traversal& traversal, const Pairs& pairs) {
+             [&](const ProviderSession& session, const Traversal& traversal, const AssociationPair& pair) {
                  const Class& owner = *findClass(traversal.target->referenceClass);
-                 const PropertyList list(properties, owner);
-                 for (const AssociationPair& pair : pairs) {
-                     const CMPIInstance* instance = isComputerEnd(*traversal.target)
-                                                        ? pair.computer.instance
-                                                        : session.find(localPath(pair.element, owner), owner);
-                     if (instance != nullptr) {
-                         answers.push_back(list.applied(request.broker(), instance));
-                     }
+                 const CMPIInstance* instance = isComputerEnd(*traversal.target)
+                                                    ? pair.computer.instance
+                                                    : session.find(localPath(pair.element, owner), owner);
+                 if (instance != nullptr) {
+                     answers.push_back(PropertyList(properties, owner).applied(request.broker(), instance));
                  }
              });
-    restrict(request, resultClass, answers, pathOf);
-    request.give(answers);
+    giveOfClass(request, resultClass, answers, pathOf);
 }
 
 void associatorNames(const Request& request, const char* associationClass, const char* resultClass, const char* role,
                      const char* resultRole) {
     std::vector<const CMPIObjectPath*> answers;
     traverse(request, {associationClass, role, resultRole},
-             [&](const ProviderSession&, const Traversal& traversal, const Pairs& pairs) {
-                 for (const AssociationPair& pair : pairs) {
-                     answers.push_back(pathAt(*traversal.target, pair));
-                 }
+             [&](const ProviderSession&, const Traversal& traversal, const AssociationPair& pair) {
+                 answers.push_back(pathAt(*traversal.target, pair));
              });
-    restrict(request, resultClass, answers, [](const CMPIObjectPath* path) { return path; });
-    request.give(answers);
+    giveOfClass(request, resultClass, answers, [](const CMPIObjectPath* path) { return path; });
 }
 
 void references(const Request& request, const char* associationClass, const char* role, const char**) {
@@ -324,11 +313,11 @@ void referenceNames(const Request& request, const char* associationClass, const 
 }
 
 void enumerateAssociations(const Request& request, const Class& association) {
-    request.give(allOf(request, association, associationInstance));
+    giveAll(request, association, associationInstance);
 }
 
 void enumerateAssociationNames(const Request& request, const Class& association) {
-    request.give(allOf(request, association, associationPath));
+    giveAll(request, association, associationPath);
 }
 
 void getAssociation(const Request& request, const Class& association) {

@@ -1,5 +1,7 @@
 #include "Differences.h"
 
+#include "cim/DateTime.h"
+
 #include <algorithm>
 #include <string_view>
 
@@ -33,13 +35,13 @@ std::string storedValue(const Property& property, const std::string& returned) {
 
 /** The value in a record file of a property that is null. */
 std::string storedNull(const Property& property) {
-    return isDate(property) ? noDate : property.type == CMPI_string ? "" : "0";
+    return isDate(property) ? std::string(cim::noDate) : property.type == CMPI_string ? "" : "0";
 }
 
 /** The datetime with the offset "-000", if it is zero: "+000" is equal. */
 std::string normalized(const std::string& dateTime) {
     constexpr std::string_view zero = "+000";
-    const std::size_t offset = std::string_view(noDate).size() - zero.size();
+    const std::size_t offset = cim::noDate.size() - zero.size();
     const bool hasPlus = dateTime.size() == offset + zero.size() && dateTime.compare(offset, zero.size(), zero) == 0;
     return hasPlus ? dateTime.substr(0, offset) + "-000" : dateTime;
 }
@@ -59,7 +61,7 @@ std::string_view trimmed(std::string_view value, bool alsoNonAscii) {
 bool isCurrent(const Property& property, const CMPIInstance* current, const std::string& given, bool isListed) {
     const auto value = propertyOf(current, property);
     if (isDate(property)) {
-        return normalized(value.value_or(noDate)) == normalized(given);
+        return normalized(value.value_or(std::string(cim::noDate))) == normalized(given);
     }
     if (!value) {
         return !property.isWritable && property.type == CMPI_string && given.empty();
@@ -84,8 +86,8 @@ Values diff(const CMPIInstance* current, const Values& given, bool areListed) {
             fail(CMPI_RC_ERR_INVALID_PARAMETER,
                  std::string(property->name) + " is read-only. Omit it, or send it back unchanged.");
         }
-        const bool isNoDate = isDate(*property) && normalized(value) == noDate;
-        changes.emplace_back(property, isNoDate ? noDate : value);
+        const bool isNoDate = isDate(*property) && cim::isNoDate(value);
+        changes.emplace_back(property, isNoDate ? std::string(cim::noDate) : value);
     }
     return changes;
 }
@@ -111,7 +113,7 @@ Values rollbackValues(const Class& owner, const DataFile& file, const Values& ch
     for (const Property& property : owner) {
         const auto value = propertyOf(current, property);
         if (isAmong(property, changes) || (!file.hasRecords() && value && !property.isKey)) {
-            values.emplace_back(&property, storedValue(property, value.value_or(noDate)));
+            values.emplace_back(&property, storedValue(property, value.value_or(std::string(cim::noDate))));
         }
     }
     return values;

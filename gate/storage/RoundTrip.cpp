@@ -1,7 +1,8 @@
 #include "RoundTrip.h"
 
+#include "cim/DateTime.h"
+
 #include "KO/Settings.h"
-#include "KO/Utils.h"
 
 #include <algorithm>
 #include <string_view>
@@ -36,25 +37,9 @@ constexpr Rule rules[] = {
     {[](std::string_view value) { return value.size() == 1; }, false, "a value of one character is lost"},
 };
 
-bool isDigits(std::string_view value) {
-    return std::all_of(value.begin(), value.end(), [](char each) { return each >= '0' && each <= '9'; });
-}
-
-bool isInterval(std::string_view value) {
-    constexpr std::size_t length = 25;
-    return value.size() == length && isDigits(value.substr(0, 14)) && value[14] == '.' &&
-           isDigits(value.substr(15, 6)) && value.substr(21) == ":000" && value.substr(8, 2) < "24" &&
-           value.substr(10, 2) < "60" && value.substr(12, 2) < "60";
-}
-
-/** Converts the datetime to a date and back, as the framework does: only a valid one stays the same. */
-bool isPointInTime(const std::string& value) {
-    return value != noDate && KO::Utils::convertCIMDateTime(KO::Utils::convertStringToDateTime(value)) == value;
-}
-
 const char* lossOf(const DataFile& file, const Property& property, const std::string& value) {
     if (property.type == CMPI_dateTime) {
-        return value == noDate || isRepresentable(file, value) ? nullptr : "it is not a valid datetime";
+        return value == cim::noDate || isRepresentable(file, value) ? nullptr : "it is not a valid datetime";
     }
     if (property.type != CMPI_string || !file.hasRecords()) {
         return nullptr;
@@ -75,7 +60,7 @@ bool refusesLossyValues() {
 }  // namespace
 
 bool isRepresentable(const DataFile& file, const std::string& dateTime) {
-    return isPointInTime(dateTime) || (file.hasRecords() && isInterval(dateTime));
+    return cim::isPointInTime(dateTime) || (file.hasRecords() && cim::isInterval(dateTime));
 }
 
 bool survivesRoundTrip(const DataFile& file, const Property& property, const std::string& value) {
