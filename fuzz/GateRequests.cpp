@@ -1,10 +1,10 @@
 #include "ProviderModel.h"
 #include "Target.h"
 
+#include "cim/Names.h"
 #include "framework/PropertyText.h"
 #include "model/Request.h"
 #include "schema/MofWriter.h"
-#include "schema/Names.h"
 #include "support/AssetModel.h"
 #include "support/Values.h"
 
@@ -30,7 +30,7 @@ fuzz::Interfaces fuzz::openInterfaces(const CMPIBroker* broker) {
 namespace {
 
 using namespace fuzz;
-using cimhost::sameName;
+using cim::sameName;
 using testsupport::AssetField;
 using testsupport::AssetKind;
 using testsupport::Form;
@@ -44,7 +44,7 @@ constexpr const char* identifierName = "InstanceID";
 
 bool isListed(const Call& call, const char* property) {
     return !call.properties || std::any_of(call.properties->begin(), call.properties->end(),
-                                           [&](const std::string& each) { return sameName(each, property); });
+                                           [&](const std::string& each) { return cim::sameName(each, property); });
 }
 
 /** A value that a client gives for a field; none where it gives none. */
@@ -192,7 +192,7 @@ private:
                               const Kept& after) {
         const Store* store = storeOf(call.path.className);
         if (store == nullptr) {
-            require(sameName(call.path.className, "VELKO_AssetIDDetails"), "only some classes can be changed");
+            require(cim::sameName(call.path.className, "VELKO_AssetIDDetails"), "only some classes can be changed");
             require(before.leases == after.leases && before.warranties == after.warranties, "records stay");
             return requireAsset(call, before.asset, after.asset);
         }

@@ -2,9 +2,9 @@
 
 #include "Target.h"
 
+#include "cim/Names.h"
 #include "schema/Errors.h"
 #include "schema/MofReader.h"
-#include "schema/Names.h"
 
 #include <string>
 
@@ -40,10 +40,10 @@ const cimhost::Schema& schema() {
 }
 
 void requireSound(const cimhost::ObjectPath& path) {
-    require(cimhost::isName(path.className), "a path has a class");
+    require(cim::isName(path.className), "a path has a class");
     require(!path.nameSpace.empty(), "a path has a namespace");
     for (const cimhost::NamedValue& key : path.keys) {
-        require(cimhost::isName(key.name), "a key has a name");
+        require(cim::isName(key.name), "a key has a name");
         require(!key.value.isNull && key.value.elements.size() == 1, "a key has a value");
     }
 }

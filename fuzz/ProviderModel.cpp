@@ -2,8 +2,8 @@
 
 #include "Target.h"
 
+#include "cim/Names.h"
 #include "framework/PropertyText.h"
-#include "schema/Names.h"
 #include "support/AssetModel.h"
 
 #include <algorithm>
@@ -22,7 +22,7 @@ using testsupport::ModelRecord;
 
 const Value* valueNamed(const std::vector<NamedValue>& values, const char* name) {
     const auto found = std::find_if(values.begin(), values.end(),
-                                    [&](const NamedValue& each) { return cimhost::sameName(each.name, name); });
+                                    [&](const NamedValue& each) { return cim::sameName(each.name, name); });
     return found == values.end() ? nullptr : &found->value;
 }
 
@@ -72,7 +72,7 @@ std::optional<std::string> givenText(const Instance& instance, const char* name)
         return std::nullopt;
     }
     if (const auto* date = std::get_if<cimhost::DateTime>(scalar)) {
-        return date->text;
+        return date->value;
     }
     const auto* text = std::get_if<std::string>(scalar);
     return text == nullptr ? std::nullopt : std::optional<std::string>(*text);

@@ -2,9 +2,9 @@
 #include "Target.h"
 
 #include "LeaseAndWarrantyProvider.h"
+#include "cim/Names.h"
 #include "model/Request.h"
 #include "schema/MofWriter.h"
-#include "schema/Names.h"
 #include "support/AssetModel.h"
 #include "support/Values.h"
 
@@ -23,13 +23,13 @@ fuzz::Interfaces fuzz::openInterfaces(const CMPIBroker* broker) {
 namespace {
 
 using namespace fuzz;
-using cimhost::sameName;
+using cim::sameName;
 
 constexpr std::size_t mostCalls = 40;
 constexpr std::size_t mostRecords = 40;
 
 bool isOneOf(const std::string& name, std::initializer_list<const char*> names) {
-    return std::any_of(names.begin(), names.end(), [&](const char* each) { return sameName(each, name); });
+    return std::any_of(names.begin(), names.end(), [&](const char* each) { return cim::sameName(each, name); });
 }
 
 bool isSetting(const std::string& className) {
@@ -98,19 +98,19 @@ private:
     Expectation expectOfClass(const Call& call) {
         const std::string& name = call.path.className;
         const bool isRead = call.action <= Action::getInstance;
-        if (sameName(name, "VELKO_Lease")) {
+        if (cim::sameName(name, "VELKO_Lease")) {
             return leases.apply(call);
         }
-        if (sameName(name, "VELKO_Warranty")) {
+        if (cim::sameName(name, "VELKO_Warranty")) {
             return warranties.apply(call);
         }
-        if (sameName(name, "VELKO_AssetIDDetails") && (isRead || call.action == Action::modifyInstance)) {
+        if (cim::sameName(name, "VELKO_AssetIDDetails") && (isRead || call.action == Action::modifyInstance)) {
             return asset.apply(call);
         }
         if (isSetting(name) && call.action == Action::getInstance) {
             return other(CMPI_RC_ERR_NOT_SUPPORTED);
         }
-        const bool isServed = isRead && (isSetting(name) || sameName(name, "VELKO_OstrelAgent"));
+        const bool isServed = isRead && (isSetting(name) || cim::sameName(name, "VELKO_OstrelAgent"));
         return other(isServed ? CMPI_RC_OK : CMPI_RC_ERR_INVALID_CLASS);
     }
 
@@ -147,7 +147,7 @@ private:
         const testsupport::RecordModel model(store == nullptr ? testsupport::ModelFields{} : store->fields());
         for (const auto& instance : cimhost::eventsOf<cimhost::Instance>(answer.events)) {
             require(instance.path.nameSpace == call.path.nameSpace, "an instance is in the request's namespace");
-            const bool isAsset = sameName(call.path.className, "VELKO_AssetIDDetails");
+            const bool isAsset = cim::sameName(call.path.className, "VELKO_AssetIDDetails");
             shown.push_back(isAsset ? testsupport::shownAsset(instance) : model.shownFields(instance));
         }
         for (const auto& path : cimhost::eventsOf<cimhost::ObjectPath>(answer.events)) {

@@ -2,8 +2,8 @@
 
 #include "Target.h"
 
+#include "cim/Names.h"
 #include "schema/Errors.h"
-#include "schema/Names.h"
 
 #include <algorithm>
 #include <sstream>
@@ -49,7 +49,7 @@ Registrations read(const std::string& text) {
 }
 
 void requireComplete(const ProviderRegistration& registration) {
-    require(cimhost::isName(registration.className), "a class has a name");
+    require(cim::isName(registration.className), "a class has a name");
     require(!registration.provider.empty() && !registration.location.empty(), "a class has a provider");
     require(!registration.nameSpaces.empty(), "a class has a namespace");
     require(registration.source.rfind("input:", 0) == 0, "a stanza knows where it stands");

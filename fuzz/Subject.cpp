@@ -3,8 +3,8 @@
 #include "LeaseBase.h"
 #include "RecordFile.h"
 #include "WarrantyBase.h"
+#include "cim/Names.h"
 #include "schema/MofReader.h"
-#include "schema/Names.h"
 #include "support/AgentEnvironment.h"
 #include "support/Files.h"
 #include "support/Values.h"
@@ -56,7 +56,7 @@ public:
             return cimhost::notSupported(request.operation);
         }
         const cimhost::ObjectPath& path = request.path;
-        if (kind == 3 || !cimhost::sameName(path.className, computerClass)) {
+        if (kind == 3 || !cim::sameName(path.className, computerClass)) {
             return cimhost::Response::failed({CMPI_RC_ERR_FAILED, "no computers"});
         }
         std::vector<cimhost::Instance> found;
@@ -153,7 +153,7 @@ const Store& warrantyStore() {
 
 const Store* storeOf(const std::string& className) {
     for (const Store* store : {&leaseStore(), &warrantyStore()}) {
-        if (cimhost::sameName(className, store->className)) {
+        if (cim::sameName(className, store->className)) {
             return store;
         }
     }

@@ -8,7 +8,7 @@
 #include "broker/Messages.h"
 #include "broker/NamedValues.h"
 #include "broker/ToText.h"
-#include "schema/Text.h"
+#include "cim/DateTime.h"
 
 // CMPIBrokerEncFT: making encapsulated objects, and services around them.
 
@@ -75,29 +75,30 @@ CMPIArray* newArray(const CMPIBroker* broker, CMPICount size, CMPIType type, CMP
 }
 
 CMPIDateTime* newDateTime(const CMPIBroker* broker, CMPIStatus* rc) {
-    return guarded<CMPIDateTime*>(rc, nullptr, [&] { return arenaOf(broker).make<CMPIDateTime>({currentTimeText()}); });
+    return guarded<CMPIDateTime*>(rc, nullptr,
+                                  [&] { return arenaOf(broker).make<CMPIDateTime>({formatCurrentTime()}); });
 }
 
 CMPIDateTime* newDateTimeFromBinary(const CMPIBroker* broker, CMPIUint64 microseconds, CMPIBoolean interval,
                                     CMPIStatus* rc) {
     return guarded<CMPIDateTime*>(rc, nullptr, [&] {
-        const std::optional<std::string> text =
-            interval != 0 ? intervalText(microseconds) : timeText(static_cast<std::int64_t>(microseconds));
-        if (!text) {
+        const std::optional<std::string> formatted =
+            interval != 0 ? formatInterval(microseconds) : formatTime(static_cast<std::int64_t>(microseconds));
+        if (!formatted) {
             throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "The time is out of range.");
         }
-        return arenaOf(broker).make<CMPIDateTime>({*text});
+        return arenaOf(broker).make<CMPIDateTime>({*formatted});
     });
 }
 
 CMPIDateTime* newDateTimeFromChars(const CMPIBroker* broker, const char* text, CMPIStatus* rc) {
     return guarded<CMPIDateTime*>(rc, nullptr, [&] {
         Arena& arena = arenaOf(broker);
-        const std::string time = argument(text);
-        if (!isDateTime(time)) {
-            throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "'" + time + "' is no CIM datetime.");
+        const std::string dateTime = argument(text);
+        if (!cim::isDateTime(dateTime)) {
+            throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "'" + dateTime + "' is not a CIM datetime.");
         }
-        return arena.make<CMPIDateTime>({time});
+        return arena.make<CMPIDateTime>({dateTime});
     });
 }
 

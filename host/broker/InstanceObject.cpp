@@ -4,14 +4,14 @@
 #include "broker/Encapsulation.h"
 #include "broker/FunctionTables.h"
 #include "broker/NamedValues.h"
-#include "schema/Names.h"
+#include "cim/Names.h"
 
 namespace cimhost {
 namespace {
 
 const PropertyInfo* findProperty(const ClassInfo& classInfo, const std::string& name) {
     const auto found = std::find_if(classInfo.properties.begin(), classInfo.properties.end(),
-                                    [&](const PropertyInfo& each) { return sameName(each.name, name); });
+                                    [&](const PropertyInfo& each) { return cim::sameName(each.name, name); });
     return found == classInfo.properties.end() ? nullptr : &*found;
 }
 
@@ -24,7 +24,7 @@ bool isKey(const InstanceContent& instance, const std::string& name) {
 bool accepts(const InstanceContent& instance, const std::string& name) {
     const PropertyList& list = instance.accepted;
     return !list || (!instance.filtersKeys && isKey(instance, name)) ||
-           std::any_of(list->begin(), list->end(), [&](const std::string& each) { return sameName(each, name); });
+           std::any_of(list->begin(), list->end(), [&](const std::string& each) { return cim::sameName(each, name); });
 }
 
 /** Failure when the class is known and has no such property, or has it with another type. */
@@ -47,7 +47,7 @@ void withdrawGiven(InstanceContent& target, const std::string& name) {
     auto& values = target.value.properties;
     const auto end = values.begin() + static_cast<std::ptrdiff_t>(target.given);
     const auto found =
-        std::find_if(values.begin(), end, [&](const NamedValue& each) { return sameName(each.name, name); });
+        std::find_if(values.begin(), end, [&](const NamedValue& each) { return cim::sameName(each.name, name); });
     if (found != end) {
         values.erase(found);
         --target.given;

@@ -34,7 +34,7 @@ std::string textOf(const InstanceContent& instance) {
 }
 
 std::string textOf(const DateTime& time) {
-    return time.text;
+    return time.value;
 }
 
 std::string textOf(const ArrayContent& array) {

@@ -23,7 +23,7 @@ const char* getCharPtr(const CMPIString* string, CMPIStatus* rc) {
 /** A time before 1970 comes as the two's complement of the microseconds until then. */
 CMPIUint64 getBinaryFormat(const CMPIDateTime* time, CMPIStatus* rc) {
     return guarded<CMPIUint64>(rc, 0, [&] {
-        const std::optional<std::int64_t> binary = microseconds(content(time).text);
+        const std::optional<std::int64_t> binary = microsecondsOf(content(time).value);
         if (!binary) {
             throw Failure(CMPI_RC_ERR_FAILED, "A datetime with unknown fields has no binary form.");
         }
@@ -34,13 +34,13 @@ CMPIUint64 getBinaryFormat(const CMPIDateTime* time, CMPIStatus* rc) {
 CMPIString* getStringFormat(const CMPIDateTime* time, CMPIStatus* rc) {
     return guarded<CMPIString*>(rc, nullptr, [&] {
         const auto& object = self(time);
-        return arenaFor(object).make<CMPIString>(object.content->text);
+        return arenaFor(object).make<CMPIString>(object.content->value);
     });
 }
 
 CMPIBoolean isIntervalTime(const CMPIDateTime* time, CMPIStatus* rc) {
     return guarded<CMPIBoolean>(rc, 0,
-                                [&] { return static_cast<CMPIBoolean>(isInterval(content(time).text) ? 1 : 0); });
+                                [&] { return static_cast<CMPIBoolean>(isIntervalForm(content(time).value) ? 1 : 0); });
 }
 
 // CMPIArray.

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "cim/Names.h"
 #include "cli/ExitStatus.h"
 #include "cli/Output.h"
 #include "cli/RequestBuilder.h"
@@ -137,7 +138,7 @@ std::vector<ListedClass> listClasses(const Schema& schema, const std::vector<Pro
         list.push_back({each->name, each});
     }
     for (const ProviderRegistration& registration : registrations) {
-        const auto same = [&](const ListedClass& each) { return sameName(each.name, registration.className); };
+        const auto same = [&](const ListedClass& each) { return cim::sameName(each.name, registration.className); };
         auto listed = std::find_if(list.begin(), list.end(), same);
         if (listed == list.end()) {
             listed = list.insert(list.end(), {registration.className});

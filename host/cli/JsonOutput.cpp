@@ -2,10 +2,10 @@
 
 #include <nlohmann/json.hpp>
 
+#include "cim/Utf8.h"
 #include "operations/StatusText.h"
 #include "schema/CimType.h"
 #include "schema/ObjectPathText.h"
-#include "schema/Text.h"
 
 namespace cimhost::json {
 namespace {
@@ -19,10 +19,10 @@ struct ScalarJson {
     Json operator()(std::monostate) const { return nullptr; }
     Json operator()(Char16 value) const {
         std::string text;
-        appendUtf8(text, value.code);
+        cim::appendUtf8(text, value.code);
         return text;
     }
-    Json operator()(const DateTime& value) const { return value.text; }
+    Json operator()(const DateTime& value) const { return value.value; }
     Json operator()(const std::shared_ptr<const ObjectPath>& value) const {
         return value ? pathJson(*value) : Json(nullptr);
     }

@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <numeric>
 
-#include "schema/Names.h"
+#include "cim/Names.h"
 
 namespace cimhost {
 namespace {
@@ -30,7 +30,7 @@ std::string nearest(std::string_view word, const std::vector<std::string>& names
     std::string found;
     std::size_t least = std::max<std::size_t>(1, word.size() / 4) + 1;
     for (const std::string& name : names) {
-        const std::size_t far = distance(foldedName(word), foldedName(name));
+        const std::size_t far = distance(cim::foldedName(word), cim::foldedName(name));
         if (far < least) {
             least = far;
             found = name;

@@ -14,9 +14,9 @@ namespace cimhost {
 struct ObjectPath;
 struct Instance;
 
-/** A CIM datetime: the 25 characters of its text, a time or an interval. */
+/** A CIM datetime: a point in time or an interval, as the standard's 25 characters. */
 struct DateTime {
-    std::string text;
+    std::string value;
 };
 
 /** One 16-bit character. */

@@ -42,7 +42,7 @@ Status ManagerBehaviour::statusOf(const ProviderResponse& response, Operation op
     return response.status.ok() ? Status{} : Status{response.status.rc, messageOf(response, operation)};
 }
 
-Answer<ObjectPath> ManagerBehaviour::createdPath(const ProviderResponse& response) const {
+StatusOr<ObjectPath> ManagerBehaviour::createdPath(const ProviderResponse& response) const {
     for (const ResultEvent& event : response.events) {
         if (const auto* path = std::get_if<ObjectPath>(&event)) {
             return {{}, *path};

@@ -86,7 +86,7 @@ public:
     virtual Status statusOf(const ProviderResponse& response, Operation operation) const;
 
     /** The path of a created instance: the first that is returned, as such or in an instance. */
-    virtual Answer<ObjectPath> createdPath(const ProviderResponse& response) const;
+    virtual StatusOr<ObjectPath> createdPath(const ProviderResponse& response) const;
     ///@}
 };
 

@@ -4,9 +4,9 @@
 #include <utility>
 
 #include "broker/NamedValues.h"
+#include "cim/Names.h"
 #include "operations/RequestRunner.h"
 #include "operations/ResponseMapping.h"
-#include "schema/Names.h"
 
 namespace cimhost {
 namespace {
@@ -80,7 +80,7 @@ void ObjectManager::completeContext(Request& request) const {
 ProviderAddress ObjectManager::addressOf(const ServedClass& served) const {
     ProviderAddress address = served.address;
     if (policy.startsProviderPerClass) {
-        address.forClass = foldedName(served.className);
+        address.forClass = cim::foldedName(served.className);
     }
     return address;
 }
@@ -164,7 +164,7 @@ Response ObjectManager::performForAssociation(Request request) {
     std::vector<ProviderResponse> responses;
     for (const ServedClass* served : found) {
         if (namesClass) {
-            const bool isRequested = requested && sameName(served->className, *requested);
+            const bool isRequested = requested && cim::sameName(served->className, *requested);
             request.filter.*associationClass = isRequested ? *requested : served->className;
         }
         responses.push_back(call<CMPIAssociationMI>(*served, request));

@@ -59,7 +59,7 @@ Status collectOne(const Request& request, Response& response) {
 }
 
 Status collectCreated(const ManagerBehaviour& behaviour, Response& response) {
-    Answer<ObjectPath> created = behaviour.createdPath(response.providers.front());
+    StatusOr<ObjectPath> created = behaviour.createdPath(response.providers.front());
     if (created.ok()) {
         response.paths.push_back(std::move(created.value));
     }

@@ -1,6 +1,6 @@
 #include "operations/StatusText.h"
 
-#include "schema/Text.h"
+#include "schema/StringLiteral.h"
 
 namespace cimhost {
 namespace {
@@ -39,7 +39,7 @@ constexpr Row codes[] = {
 
 /** The text as one line without control characters. */
 std::string oneLine(const std::string& text) {
-    const std::string escaped = inQuotes(text);
+    const std::string escaped = quoted(text);
     std::string line;
     for (std::size_t i = 1; i + 1 < escaped.size(); ++i) {
         const bool plain = escaped[i] == '\\' && (escaped[i + 1] == '"' || escaped[i + 1] == '\\');

@@ -4,9 +4,9 @@
 #include <cmath>
 #include <limits>
 
+#include "cim/DateTime.h"
 #include "schema/CimType.h"
 #include "schema/Errors.h"
-#include "schema/Text.h"
 
 namespace cimhost {
 namespace {
@@ -88,7 +88,7 @@ Scalar dateTimeScalar(const Literal& literal, CMPIType type) {
         "it must be 25 characters, a time such as \"20260131120000.000000+060\" or an interval such as "
         "\"00000007000000.000000:000\"";
     const std::string& text = textOf(literal, type, remedy);
-    if (!isDateTime(text) && !isNoDateTime(text)) {
+    if (!cim::isDateTime(text) && !cim::isNoDate(text)) {
         refuse(literal, type, remedy);
     }
     return DateTime{text};

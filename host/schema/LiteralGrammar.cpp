@@ -7,7 +7,7 @@
 #include <sstream>
 
 #include "schema/Errors.h"
-#include "schema/Text.h"
+#include "schema/StringLiteral.h"
 
 namespace cimhost::grammar {
 namespace {
@@ -45,11 +45,11 @@ Literal readCharacter(std::string_view content) {
         std::from_chars(content.data() + 2, content.data() + content.size(), unit, 16);
         return {Char16{unit}, written};
     }
-    Char16 character;
-    if (!singleCharacter(unescaped(content), character.code)) {
+    const std::optional<std::uint16_t> code = singleCharacter(unescaped(content));
+    if (!code) {
         throw ValueError(written + " is not a char16: it must be one character of 16 bits");
     }
-    return {character, written};
+    return {Char16{*code}, written};
 }
 
 }  // namespace

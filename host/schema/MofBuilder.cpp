@@ -58,7 +58,7 @@ void applyFlavor(Flavor& flavor, const Node& node) {
         {"ToSubclass", &Flavor::toSubclass, true},      {"ToInstance", &Flavor::toSubclass, true},
         {"Restricted", &Flavor::toSubclass, false},     {"Translatable", &Flavor::translatable, true}};
     for (const Row& row : rows) {
-        if (sameName(row.name, node.string_view())) {
+        if (cim::sameName(row.name, node.string_view())) {
             flavor.*row.member = row.value;
             return;
         }
@@ -75,8 +75,8 @@ const Node* initializerOf(const Node& node) {
 }
 
 const NamedValue* findNamed(const std::vector<NamedValue>& values, std::string_view name) {
-    const auto found =
-        std::find_if(values.begin(), values.end(), [&](const NamedValue& each) { return sameName(each.name, name); });
+    const auto found = std::find_if(values.begin(), values.end(),
+                                    [&](const NamedValue& each) { return cim::sameName(each.name, name); });
     return found == values.end() ? nullptr : &*found;
 }
 
@@ -127,7 +127,7 @@ void MofBuilder::buildDeclaration(const Node& node) {
 }
 
 void MofBuilder::buildPragma(const Node& pragma) {
-    if (sameName(findChild<mof::PragmaName>(pragma)->string_view(), "include")) {
+    if (cim::sameName(findChild<mof::PragmaName>(pragma)->string_view(), "include")) {
         const Literal file = at(pragma, [&] { return constantLiteral(pragma); });
         at(pragma, [&] { include(std::get<std::string>(file.value)); });
     }
@@ -194,7 +194,7 @@ std::vector<Qualifier> MofBuilder::readQualifiers(const Node* list) const {
     }
     for (const Node* node : children<mof::Qualifier>(*list)) {
         Qualifier qualifier = readQualifier(*node);
-        const auto same = [&](const Qualifier& each) { return sameName(each.name, qualifier.name); };
+        const auto same = [&](const Qualifier& each) { return cim::sameName(each.name, qualifier.name); };
         if (std::any_of(qualifiers.begin(), qualifiers.end(), same)) {
             fail(*node, "qualifier " + qualifier.name + " is given twice");
         }

@@ -4,6 +4,7 @@
 #include <map>
 #include <string>
 
+#include "cim/Names.h"
 #include "schema/LiteralGrammar.h"
 #include "schema/Schema.h"
 
@@ -36,7 +37,7 @@ private:
 
     Schema& schema;  ///< not owned
     Include include;
-    std::map<std::string, ObjectPath, NameLess> aliases{};
+    std::map<std::string, ObjectPath, cim::NameLess> aliases{};
 };
 
 }  // namespace cimhost

@@ -2,7 +2,7 @@
 
 #include "schema/Errors.h"
 #include "schema/MofMessages.h"
-#include "schema/Text.h"
+#include "schema/StringLiteral.h"
 #include "schema/TypedElement.h"
 
 namespace cimhost {
@@ -17,7 +17,7 @@ Literal constantLiteral(const grammar::Node& constant) {
         for (const grammar::Node* part : parts) {
             text += unescaped(part->string_view());
         }
-        std::string written = inQuotes(text);
+        std::string written = quoted(text);
         return {std::move(text), std::move(written)};
     }
     return grammar::readLiteral(*constant.children.front());

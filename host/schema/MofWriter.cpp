@@ -6,8 +6,9 @@
 #include <cstdio>
 #include <string_view>
 
+#include "cim/Utf8.h"
 #include "schema/ObjectPathText.h"
-#include "schema/Text.h"
+#include "schema/StringLiteral.h"
 
 namespace cimhost {
 namespace {
@@ -50,19 +51,19 @@ std::size_t bytesOfLiteral(std::string_view text) {
         if (written >= longestLiteral && beginsCharacter(text[at])) {
             return at;
         }
-        written += inQuotes(text.substr(at, 1)).size() - 2;
+        written += quoted(text.substr(at, 1)).size() - 2;
     }
     return text.size();
 }
 
 /** A text as literals one below the other, which a compiler puts together. */
 std::string inLiterals(std::string_view text) {
-    const std::string whole = wellFormed(text);
+    const std::string whole = cim::replaceInvalidUtf8(text);
     std::string literals;
     std::string_view rest = whole;
     do {
         const std::size_t bytes = bytesOfLiteral(rest);
-        literals += (literals.empty() ? "" : "\n        ") + inQuotes(rest.substr(0, bytes));
+        literals += (literals.empty() ? "" : "\n        ") + quoted(rest.substr(0, bytes));
         rest.remove_prefix(bytes);
     } while (!rest.empty());
     return literals;
@@ -89,7 +90,7 @@ struct ScalarText {
     std::string operator()(float value) const { return realText(value); }
     std::string operator()(double value) const { return realText(value); }
     std::string operator()(const std::string& value) const { return quote(value); }
-    std::string operator()(const DateTime& value) const { return quote(value.text); }
+    std::string operator()(const DateTime& value) const { return quote(value.value); }
     std::string operator()(const std::shared_ptr<const ObjectPath>& value) const {
         return value ? quote(formatObjectPath(*value)) : "NULL";
     }
@@ -120,11 +121,11 @@ std::string valueText(const Value& value, Quote quote) {
 }  // namespace
 
 std::string formatMof(const Value& value) {
-    return valueText(value, &inQuotes);
+    return valueText(value, &quoted);
 }
 
 std::string formatMof(const Instance& instance) {
-    return wellFormed(instanceText(instance));
+    return cim::replaceInvalidUtf8(instanceText(instance));
 }
 
 }  // namespace cimhost

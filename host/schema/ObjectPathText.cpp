@@ -2,12 +2,13 @@
 
 #include <algorithm>
 
+#include "cim/Names.h"
 #include "schema/CimType.h"
 #include "schema/Errors.h"
 #include "schema/MofValues.h"
 #include "schema/MofWriter.h"
 #include "schema/ObjectPathGrammar.h"
-#include "schema/Text.h"
+#include "schema/StringLiteral.h"
 #include "schema/TypedElement.h"
 
 namespace cimhost {
@@ -97,7 +98,7 @@ Value keyValue(const Literal& literal, const std::string& name, const Property* 
 void addKey(ObjectPath& result, const Node& node, const Class* known, const Schema& schema,
             const std::string& defaultNameSpace) {
     const std::string name = findChild<path::KeyName>(node)->string();
-    const auto same = [&](const NamedValue& key) { return sameName(key.name, name); };
+    const auto same = [&](const NamedValue& key) { return cim::sameName(key.name, name); };
     if (std::any_of(result.keys.begin(), result.keys.end(), same)) {
         throw PathError("key " + name + " is given twice");
     }

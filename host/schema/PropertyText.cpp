@@ -4,7 +4,7 @@
 #include "schema/Errors.h"
 #include "schema/MofValues.h"
 #include "schema/ObjectPathGrammar.h"
-#include "schema/Text.h"
+#include "schema/StringLiteral.h"
 #include "schema/TypedElement.h"
 
 namespace cimhost {
@@ -15,9 +15,10 @@ namespace peg = tao::pegtl;
 
 /** The text as the literal that it is where the property's type takes plain text. */
 Literal plainText(std::string_view text, const Property& property) {
-    std::uint16_t code = 0;
-    if (property.type == CMPI_char16 && singleCharacter(text, code)) {
-        return {Char16{code}, std::string(text)};
+    if (property.type == CMPI_char16) {
+        if (const std::optional<std::uint16_t> code = singleCharacter(text)) {
+            return {Char16{*code}, std::string(text)};
+        }
     }
     return {std::string(text), std::string(text)};
 }

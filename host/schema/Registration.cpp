@@ -4,8 +4,8 @@
 #include <fstream>
 #include <sstream>
 
+#include "cim/Names.h"
 #include "schema/Errors.h"
-#include "schema/Names.h"
 
 namespace cimhost {
 namespace {
@@ -60,7 +60,7 @@ private:
         }
         ProviderRegistration stanza;
         stanza.className = trimmed(text.substr(1, text.size() - 2));
-        if (!isName(stanza.className)) {
+        if (!cim::isName(stanza.className)) {
             fail("expected a class name in [ ]");
         }
         stanza.source = sourceName + ":" + std::to_string(lineNumber);
@@ -75,7 +75,7 @@ private:
         if (stanzas.empty()) {
             fail("expected [CLASS] before the first keyword");
         }
-        apply(foldedName(trimmed(text.substr(0, colon))), trimmed(text.substr(colon + 1)));
+        apply(cim::foldedName(trimmed(text.substr(0, colon))), trimmed(text.substr(colon + 1)));
     }
 
     void apply(const std::string& keyword, const std::string& value) {
@@ -110,8 +110,8 @@ private:
 
     static void readTypes(ProviderRegistration& stanza, const std::string& value) {
         for (const std::string& type : words(value)) {
-            stanza.instance = stanza.instance || sameName(type, "instance");
-            stanza.association = stanza.association || sameName(type, "association");
+            stanza.instance = stanza.instance || cim::sameName(type, "instance");
+            stanza.association = stanza.association || cim::sameName(type, "association");
         }
     }
 

@@ -6,8 +6,8 @@
 #include <string_view>
 #include <vector>
 
+#include "cim/Names.h"
 #include "model/Value.h"
-#include "schema/Names.h"
 
 namespace cimhost {
 
@@ -111,9 +111,9 @@ public:
     void add(Instance instance) { declaredInstances.push_back(std::move(instance)); }
 
 private:
-    std::map<std::string, std::unique_ptr<const Class>, NameLess> byName;
+    std::map<std::string, std::unique_ptr<const Class>, cim::NameLess> byName;
     std::vector<const Class*> inOrder;
-    std::map<std::string, QualifierDeclaration, NameLess> qualifierDeclarations;
+    std::map<std::string, QualifierDeclaration, cim::NameLess> qualifierDeclarations;
     std::vector<Instance> declaredInstances;
 };
 

@@ -4,8 +4,8 @@
 #include <cstdint>
 #include <limits>
 
+#include "cim/DateTime.h"
 #include "schema/MofWriter.h"
-#include "schema/Text.h"
 #include "support/Values.h"
 
 namespace testsupport {
@@ -97,7 +97,7 @@ private:
 
 /** Whether a datetime property can have the text: a date or an interval without asterisks. */
 bool isShownDate(const std::string& text) {
-    return cimhost::isDateTime(text) && text.find('*') == std::string::npos;
+    return cim::isPointInTime(text) || cim::isInterval(text);
 }
 
 /** What the property shows for a value, as MOF. An object manager gets no character after a null. */

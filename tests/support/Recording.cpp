@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <stdexcept>
 
-#include "schema/Names.h"
+#include "cim/Names.h"
 
 namespace testsupport {
 
@@ -21,7 +21,7 @@ void Recording::silence(const CMPIString* string) {
 std::optional<Verdict> Recording::note(RecordedCall call, const void* object) {
     const std::lock_guard<std::mutex> lock(mutex);
     const int number = ++counts[call.function];
-    const std::string name = call.arguments.empty() ? std::string{} : cimhost::foldedName(call.arguments.front());
+    const std::string name = call.arguments.empty() ? std::string{} : cim::foldedName(call.arguments.front());
     const auto byName = dataOrders.find({call.function, name});
     const std::vector<Order>& ofFunction = orders[call.function];
     const bool isSilent = call.function == "CMPIStringFT.getCharPtr" && silent.count(object) != 0;
@@ -47,7 +47,7 @@ void Recording::order(const std::string& function, std::optional<int> number, Ve
 void Recording::orderData(const std::string& function, const std::string& name, Verdict verdict) {
     requireFunction(function);
     const std::lock_guard<std::mutex> lock(mutex);
-    dataOrders[{function, cimhost::foldedName(name)}] = verdict;
+    dataOrders[{function, cim::foldedName(name)}] = verdict;
 }
 
 void Recording::orderState(const std::string& function, CMPIValueState state) {

@@ -5,7 +5,7 @@
 #include <utility>
 
 #include "broker/Arena.h"
-#include "schema/Names.h"
+#include "cim/Names.h"
 #include "support/Recording.h"
 
 namespace testsupport {
@@ -19,15 +19,15 @@ public:
         for (const cimhost::Instance& instance : response.instances) {
             response.paths.push_back(instance.path);
         }
-        served[cimhost::foldedName(className)] = std::move(response);
+        served[cim::foldedName(className)] = std::move(response);
     }
 
     void fail(const std::string& className, CMPIrc rc) {
-        served[cimhost::foldedName(className)] = cimhost::Response::failed({rc, "ordered to fail"});
+        served[cim::foldedName(className)] = cimhost::Response::failed({rc, "ordered to fail"});
     }
 
     cimhost::Response perform(cimhost::Request request) override {
-        const auto found = served.find(cimhost::foldedName(request.path.className));
+        const auto found = served.find(cim::foldedName(request.path.className));
         if (request.operation > cimhost::Operation::enumerateInstanceNames) {
             return cimhost::notSupported(request.operation);
         }

@@ -76,7 +76,7 @@ TEST(ObjectPath, StringKeysTakeEscapesAndAnyOtherByte) {
 
 TEST(ObjectPath, DateTimeAndCharacterKeysAreTypedByTheClass) {
     const ObjectPath path = parse(R"(Visit.At="20260131120000.000000+060",Mark='x')");
-    EXPECT_EQ(element<DateTime>(path.keys[0].value).text, "20260131120000.000000+060");
+    EXPECT_EQ(element<DateTime>(path.keys[0].value).value, "20260131120000.000000+060");
     EXPECT_EQ(element<Char16>(path.keys[1].value).code, u'x');
 }
 
@@ -185,7 +185,7 @@ INSTANTIATE_TEST_SUITE_P(
                     BadPath{"//", "character 3: expected the name of a host"},
                     BadPath{"//host", "character 7: expected / after"}, BadPath{"http://h/r:Disk", "character 6"},
                     BadPath{"1Disk", "character 1"}, BadPath{"Disk.ID==\"x\"", "character 9"},
-                    BadPath{"Disk.ID=\"\\xD800\"", "half a character"}, BadPath{"Disk.ID=\"\\x0\"", "\\x0"}));
+                    BadPath{"Disk.ID=\"\\xD800\"", "surrogate"}, BadPath{"Disk.ID=\"\\x0\"", "\\x0"}));
 
 TEST(ObjectPathError, ANullCharacterIsNoPartOfAKey) {
     using namespace std::string_view_literals;

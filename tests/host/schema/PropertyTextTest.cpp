@@ -45,8 +45,8 @@ TEST(PropertyText, OtherTypesAreConstants) {
     EXPECT_EQ(element<std::int64_t>(parse("S64", "-12")), -12);
     EXPECT_FLOAT_EQ(element<float>(parse("R32", "1.5")), 1.5F);
     EXPECT_FLOAT_EQ(element<float>(parse("R32", "2")), 2.0F);
-    EXPECT_EQ(element<DateTime>(parse("Time", "20260131120000.000000+060")).text, "20260131120000.000000+060");
-    EXPECT_EQ(element<DateTime>(parse("Time", "00000000000000.000000+000")).text, "00000000000000.000000+000");
+    EXPECT_EQ(element<DateTime>(parse("Time", "20260131120000.000000+060")).value, "20260131120000.000000+060");
+    EXPECT_EQ(element<DateTime>(parse("Time", "00000000000000.000000+000")).value, "00000000000000.000000+000");
 }
 
 TEST(PropertyText, ACharacterMayStandAloneOrInApostrophes) {

@@ -43,7 +43,7 @@ std::vector<std::string> associated(const Response& response, const std::string&
     return paths;
 }
 
-Answer<Baseline> takeBaseline(ObjectManager& manager, const Plan& plan) {
+StatusOr<Baseline> takeBaseline(ObjectManager& manager, const Plan& plan) {
     Baseline baseline;
     for (const LoadClass& each : plan.classes) {
         const Response found = manager.perform(Request::enumerateInstanceNames(each.path));

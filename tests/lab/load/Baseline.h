@@ -28,7 +28,7 @@ struct Baseline {
 };
 
 /** Asks for it, with one request after the other. A status other than OK when an answer is a failure. */
-Answer<Baseline> takeBaseline(ObjectManager& manager, const Plan& plan);
+StatusOr<Baseline> takeBaseline(ObjectManager& manager, const Plan& plan);
 
 /** The results of an enumeration; paths are instances without properties. */
 std::vector<Instance> listed(const Response& response);

@@ -3,12 +3,11 @@
 #include <algorithm>
 
 #include "broker/NamedValues.h"
+#include "cim/Names.h"
 #include "lab/load/Values.h"
 #include "operations/StatusText.h"
 #include "schema/MofWriter.h"
-#include "schema/Names.h"
 #include "schema/ObjectPathText.h"
-#include "schema/Text.h"
 
 namespace cimhost::lab {
 namespace {
@@ -61,8 +60,8 @@ Verdict checkStatus(const Status& status, int code) {
 }
 
 Verdict checkPath(const ObjectPath& created, const ObjectPath& expected) {
-    const bool isSame = sameName(created.className, expected.className) && created.keys.size() == 1 &&
-                        sameName(created.keys.front().name, expected.keys.front().name) &&
+    const bool isSame = cim::sameName(created.className, expected.className) && created.keys.size() == 1 &&
+                        cim::sameName(created.keys.front().name, expected.keys.front().name) &&
                         sameValue(created.keys.front().value, expected.keys.front().value);
     if (isSame) {
         return std::nullopt;

@@ -122,9 +122,9 @@ void requireFeasible(const Plan& plan) {
     }
 }
 
-Answer<Report> runLoad(ObjectManager& manager, const Plan& plan) {
+StatusOr<Report> runLoad(ObjectManager& manager, const Plan& plan) {
     requireFeasible(plan);
-    const Answer<Baseline> baseline = takeBaseline(manager, plan);
+    const StatusOr<Baseline> baseline = takeBaseline(manager, plan);
     if (!baseline.ok()) {
         return {baseline.status, {}};
     }

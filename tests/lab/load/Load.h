@@ -12,6 +12,6 @@ namespace cimhost::lab {
  * @return a status other than OK when how things were before the load cannot be asked for
  * @throws PlanError when the plan is not feasible, LibraryError when a provider cannot be loaded
  */
-Answer<Report> runLoad(ObjectManager& manager, const Plan& plan);
+StatusOr<Report> runLoad(ObjectManager& manager, const Plan& plan);
 
 }  // namespace cimhost::lab

@@ -112,7 +112,7 @@ CommandResult runLoadCommand(ObjectManager& manager, Manager emulated, const Loa
         throw UsageError("--raw shows what a provider did with one request; load has many");
     }
     try {
-        Answer<Report> answer = runLoad(manager, planOf(load, emulated, arguments, schema));
+        StatusOr<Report> answer = runLoad(manager, planOf(load, emulated, arguments, schema));
         if (!answer.ok()) {
             return {"", answer.status};
         }

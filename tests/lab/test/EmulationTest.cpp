@@ -2,9 +2,9 @@
 #include <thread>
 #include <utility>
 
+#include "cim/Names.h"
 #include "host/operations/OperationsFixture.h"
 #include "lab/emulation/ManagerEmulation.h"
-#include "schema/Names.h"
 
 // The differences of the object managers, one test each: the standard host, SFCB, OpenPegasus.
 
@@ -45,7 +45,7 @@ protected:
     }
 
     static std::shared_ptr<const cimhost::ClassInfo> infoOf(const std::string& name) {
-        if (cimhost::foldedName(name) == "witness_thing") {
+        if (cim::foldedName(name) == "witness_thing") {
             return std::make_shared<cimhost::ClassInfo>(cimhost::ClassInfo{"Witness_Thing",
                                                                            {{"Name", CMPI_string, false, true, {}},
                                                                             {"Text", CMPI_string, false, false, {}},

@@ -2,9 +2,9 @@
 
 #include <gtest/gtest.h>
 
+#include "cim/DateTime.h"
 #include "schema/CimType.h"
 #include "schema/MofWriter.h"
-#include "schema/Text.h"
 #include "support/Values.h"
 
 namespace {
@@ -55,7 +55,7 @@ TEST(MadeValues, DatesExist) {
     Random random(1, 1);
     for (int i = 0; i < 1000; ++i) {
         const Value value = makeValue(property(CMPI_dateTime), random);
-        EXPECT_TRUE(cimhost::isDateTime(std::get<cimhost::DateTime>(value.elements.front()).text));
+        EXPECT_TRUE(cim::isDateTime(std::get<cimhost::DateTime>(value.elements.front()).value));
     }
 }
 
