@@ -65,7 +65,7 @@ TEST(Colours, AreNotForPrograms) {
 TEST(Colours, HaveThreeWords) {
     const Ended refused = run({"--color", "blue", "ei", "Test_Box"});
     EXPECT_EQ(refused.status, 2);
-    EXPECT_THAT(refused.error, HasSubstr("blue is not one of auto, always and never"));
+    EXPECT_THAT(refused.error, HasSubstr("blue not in {auto,always,never}"));
 }
 
 class WindowOfAnyWidth : public testing::TestWithParam<unsigned short> {};

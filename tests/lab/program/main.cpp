@@ -44,7 +44,7 @@ public:
             managers.emplace_back(nameOf(each), each);
         }
         addChoice(app, "--as", "Object manager to emulate: standard (default), sfcb, pegasus or pegasus-empty-key",
-                  manager, std::move(managers))
+                  manager, managers)
             ->type_name("MANAGER");
         addLoadCommand(app, load);
     }

@@ -30,7 +30,7 @@ TEST(ManagerOption, AnExceptionWouldEndTheProcessOrIsUnknown) {
 TEST(ManagerOption, RawShowsWhatTheProviderDidAndSaysWhatComesOfIt) {
     const Ended dead = run({"--as", "sfcb", "--raw", "gi", "Test_Answer.Code=999"});
     EXPECT_EQ(dead.status, 1);
-    EXPECT_THAT(dead.output, HasSubstr("exception: \"An exception left the provider"));
+    EXPECT_THAT(dead.output, HasSubstr("exception: \"The provider threw an exception"));
     EXPECT_THAT(dead.error, HasSubstr("would have died"));
 }
 
@@ -48,7 +48,7 @@ TEST(ManagerOption, AModificationHasAllPropertiesAndAListOfItsOwn) {
 TEST(ManagerOption, AnotherNameIsWrongUsage) {
     const Ended refused = run({"--as", "cimom", "ei", "Test_Box"});
     EXPECT_EQ(refused.status, 2);
-    EXPECT_THAT(refused.error, HasSubstr("cimom is not one of standard, sfcb, pegasus and pegasus-empty-key"));
+    EXPECT_THAT(refused.error, HasSubstr("cimom not in {standard,sfcb,pegasus,pegasus-empty-key}"));
 }
 
 }  // namespace
