@@ -98,7 +98,7 @@ void requireSameDefaults(Schema& schema, const Class& each) {
         }
     }
     const std::string name = newClassName(schema);
-    cimhost::MofReader(schema).readText("class " + name + " {\n" + declarations + "};\n", "rewritten");
+    cimhost::MofReader(schema).readSource("class " + name + " {\n" + declarations + "};\n", "rewritten");
     std::string again;
     for (const Property& property : schema.findClass(name)->properties) {
         again += declaration(property);
@@ -119,7 +119,7 @@ void requireSameInstances(Schema& schema) {
     for (const cimhost::Instance& instance : instances) {
         if (isSettled(schema, instance)) {
             const std::string text = cimhost::formatMof(instance);
-            cimhost::MofReader(schema).readText(text, "rewritten");
+            cimhost::MofReader(schema).readSource(text, "rewritten");
             requireSame(cimhost::formatMof(schema.instances().back()), text, "instance that was written and read");
         }
     }
@@ -134,7 +134,7 @@ int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     }
     Schema schema;
     try {
-        cimhost::MofReader(schema).readText(text, "input", "/nonexistent");
+        cimhost::MofReader(schema).readSource(text, "input", "/nonexistent");
     } catch (const cimhost::LoadError& error) {
         require(std::string(error.what()).rfind("input:", 0) == 0, "an error begins with where it is");
     }

@@ -34,7 +34,7 @@ class Keyless { string Plain; };
 const cimhost::Schema& schema() {
     static cimhost::Schema known;
     if (known.classes().empty()) {
-        cimhost::MofReader(known).readText(classes, "classes");
+        cimhost::MofReader(known).readSource(classes, "classes");
     }
     return known;
 }

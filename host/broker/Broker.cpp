@@ -11,7 +11,7 @@
 namespace cimhost {
 namespace {
 
-/** An arena that a thread makes objects in. */
+/** An arena that a thread has entered. */
 struct Scope {
     const Broker* broker;
     Arena* arena;

@@ -15,13 +15,13 @@ namespace {
 namespace mof = grammar::mof;
 using grammar::Node;
 
-[[noreturn]] void fail(const Node& node, const std::string& text) {
+[[noreturn]] void fail(const Node& node, const std::string& message) {
     const auto position = node.begin();
     throw LoadError(position.source + ":" + std::to_string(position.line) + ":" + std::to_string(position.column) +
-                    ": " + text);
+                    ": " + message);
 }
 
-/** Runs the action; what the model finds wrong is reported at the node. */
+/** Runs the action. Rethrows its errors as LoadError with the position of the node. */
 template <typename Action>
 auto at(const Node& node, Action action) {
     try {
@@ -41,7 +41,7 @@ CMPIType readType(const Node& node) {
     const std::optional<CMPIType> type = intrinsicType(node.string_view());
     if (!type) {
         fail(node, node.string() +
-                       " is no data type: expected boolean, string, datetime, char16, uint8 to uint64, "
+                       " is not a data type: expected boolean, string, datetime, char16, uint8 to uint64, "
                        "sint8 to sint64, real32, real64, or a class name followed by REF");
     }
     return *type;
@@ -64,11 +64,11 @@ void applyFlavor(Flavor& flavor, const Node& node) {
         }
     }
     fail(node, node.string() +
-                   " is no flavor: expected EnableOverride, DisableOverride, ToSubclass, Restricted or "
+                   " is not a flavor: expected EnableOverride, DisableOverride, ToSubclass, Restricted or "
                    "Translatable");
 }
 
-/** The node's array initialiser or constant. */
+/** The array initializer or constant of a node. */
 const Node* initializerOf(const Node& node) {
     const Node* array = findChild<mof::ArrayInitializer>(node);
     return array != nullptr ? array : findChild<mof::Constant>(node);
@@ -80,7 +80,7 @@ const NamedValue* findNamed(const std::vector<NamedValue>& values, std::string_v
     return found == values.end() ? nullptr : &*found;
 }
 
-/** Gives the instance the defaults of its class and its path's keys. */
+/** Adds the default values of the class to an instance, and the keys to its path. */
 void complete(Instance& instance, const Class& declared, const Node& node) {
     for (const Property& property : declared.properties) {
         if (!property.defaultValue.isNull && findNamed(instance.properties, property.name) == nullptr) {
@@ -234,7 +234,7 @@ Value MofBuilder::readValue(const Node& initializer, const Property& type) const
         return value;
     }
     if (!type.isArray) {
-        fail(initializer, type.name + " is no array: expected one value without braces");
+        fail(initializer, type.name + " is not an array: expected one value without braces");
     }
     Value value = Value::array(type.type, {});
     for (const Node* constant : children<mof::Constant>(initializer)) {
@@ -247,10 +247,10 @@ Scalar MofBuilder::readElement(const Node& constant, const Property& type) const
     if (const Node* alias = findChild<mof::Alias>(constant)) {
         const auto known = aliases.find(alias->string_view());
         if (known == aliases.end()) {
-            fail(*alias, alias->string() + " is no alias of an instance declared before");
+            fail(*alias, alias->string() + " is not an alias of an instance declared before");
         }
         if (type.type != CMPI_ref) {
-            fail(*alias, type.name + " is no reference and takes no alias");
+            fail(*alias, type.name + " is not a reference, so its value cannot be an alias");
         }
         return std::make_shared<const ObjectPath>(known->second);
     }

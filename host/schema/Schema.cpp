@@ -32,15 +32,15 @@ void inheritQualifiers(std::vector<Qualifier>& own, const std::vector<Qualifier>
     }
 }
 
-std::string typeText(const Property& property) {
+std::string typeOf(const Property& property) {
     return (property.type == CMPI_ref ? property.referenceClass + " REF" : std::string(typeName(property.type))) +
            (property.isArray ? "[]" : "");
 }
 
 void checkOverride(const Class& declared, const Property& own, const Property& inherited) {
     if (own.type != inherited.type || own.isArray != inherited.isArray) {
-        throw std::invalid_argument("property " + declared.name + "." + own.name + " is " + typeText(own) + ", but " +
-                                    inherited.origin + " declares it as " + typeText(inherited));
+        throw std::invalid_argument("property " + declared.name + "." + own.name + " is " + typeOf(own) + ", but " +
+                                    inherited.origin + " declares it as " + typeOf(inherited));
     }
 }
 
@@ -56,7 +56,7 @@ void checkUnique(const Class& declared, const std::vector<Element>& elements, co
     }
 }
 
-/** The superclass's properties with the overriding ones in their places, then the class's further ones. */
+/** The properties of the superclass, overridden by those of the class, then the other properties of the class. */
 std::vector<Property> mergeProperties(const Class& declared, const Class& super) {
     std::vector<Property> merged = super.properties;
     for (const Property& own : declared.properties) {

@@ -64,7 +64,7 @@ void takeCharacter(std::string& string, std::string_view& rest) {
 
 }  // namespace
 
-std::string quoted(std::string_view string) {
+std::string inQuotes(std::string_view string) {
     std::string result = "\"";
     for (const char c : string) {
         const Escape* known = nullptr;

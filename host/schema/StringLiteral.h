@@ -10,7 +10,7 @@
 namespace cimhost {
 
 /** The string in quotation marks, with MOF's escapes for quotation marks, backslashes and control characters. */
-std::string quoted(std::string_view string);
+std::string inQuotes(std::string_view string);
 
 /**
  * Replaces the escapes of a string literal by their characters. A \x escape is a UTF-16 code unit, and a surrogate pair

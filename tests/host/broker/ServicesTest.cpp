@@ -81,9 +81,9 @@ TEST_F(ServicesTest, PassesLogAndTraceRecordsOn) {
     EXPECT_FALSE(records[0].isTrace);
     EXPECT_EQ(records[0].level, CMPI_SEV_WARNING);
     EXPECT_EQ(records[0].component, "id");
-    EXPECT_EQ(records[0].text, "text");
+    EXPECT_EQ(records[0].message, "text");
     EXPECT_TRUE(records[1].isTrace);
-    EXPECT_EQ(records[1].text, "string");
+    EXPECT_EQ(records[1].message, "string");
 }
 
 TEST_F(ServicesTest, ALoggerThatThrowsIsAFailure) {

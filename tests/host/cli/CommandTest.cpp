@@ -127,7 +127,7 @@ TEST(DeleteInstance, SaysNothingWhenItSucceedsAndWhyWhenItDoesNot) {
     EXPECT_EQ(missing.status, 1);
     EXPECT_EQ(missing.error,
               "cimhost: error 6 (CMPI_RC_ERR_NOT_FOUND): no such box\n"
-              "Run cimhost enumerate-instance-names Test_Box for those that there are.\n");
+              "Run cimhost enumerate-instance-names Test_Box to list the instances.\n");
 }
 
 TEST(Associators, ShowTheInstancesAtTheOtherEnd) {

@@ -70,7 +70,7 @@ INSTANTIATE_TEST_SUITE_P(
     testing::Values(
         MissingFile{{"--schema", "/no/such.mof", "classes"}, "/no/such.mof: this file does not exist"},
         MissingFile{{"--registration", "/no/such.reg", "classes"}, "/no/such.reg: this file does not exist"},
-        MissingFile{{"--library-path", "/no/such", "classes"}, "/no/such: there is no such directory of libraries"},
+        MissingFile{{"--library-path", "/no/such", "classes"}, "/no/such: this library directory does not exist"},
         MissingFile{{"--schema", dataFile("test.reg"), "classes"}, "test.reg:1:3: expected \"pragma\" after #"},
         MissingFile{{"--registration", dataFile("test.mof"), "classes"}, "test.mof:1: expected [CLASS]"},
         MissingFile{{"ei", "Test_NoLibrary"}, "libno_such_library.so"},

@@ -53,8 +53,8 @@ TEST_P(Hint, NamesTheCommandThatHelps) {
 }
 INSTANTIATE_TEST_SUITE_P(
     Failures, Hint,
-    testing::Values(Refused{{"ei", "No_Such"}, "Run cimhost classes for those that are served"},
-                    Refused{{"ei", "root/none:Test_Box"}, "Run cimhost classes for where each class is served"},
+    testing::Values(Refused{{"ei", "No_Such"}, "Run cimhost classes to list the classes"},
+                    Refused{{"ei", "root/none:Test_Box"}, "Run cimhost classes to list the namespaces of each class"},
                     Refused{{"di", "Test_Box.Name=\"none\""}, "Run cimhost enumerate-instance-names Test_Box"},
                     Refused{{"ei", "A", "B"}, "Run cimhost enumerate-instances --help"},
                     Refused{{"frobnicate"}, "Run cimhost --help"}));

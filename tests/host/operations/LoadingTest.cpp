@@ -77,7 +77,8 @@ TEST_F(LoadingTest, AMissingFunctionIsNotSupported) {
 }
 
 TEST_F(LoadingTest, AMissingLibraryIsALibraryError) {
-    EXPECT_EQ(errorOf("Unloadable"), "libDoesNotExist.so is in none of these folders: /nonexistent, " TEST_PROVIDERS);
+    EXPECT_EQ(errorOf("Unloadable"),
+              "libDoesNotExist.so is in none of these directories: /nonexistent, " TEST_PROVIDERS);
 }
 
 TEST_F(LoadingTest, AFileThatIsNoLibraryIsALibraryError) {
@@ -100,7 +101,7 @@ TEST_F(LoadingTest, AFailingFactoryIsALibraryError) {
     EXPECT_THAT(errorOf("Refusing_Thing"), testing::HasSubstr("no licence"));
     EXPECT_THAT(errorOf("Null_Thing"), testing::HasSubstr("no interface"));
     EXPECT_THAT(errorOf("Throwing_Thing"), testing::HasSubstr("no luck"));
-    EXPECT_THAT(errorOf("Selfish_Thing"), testing::HasSubstr("needs itself"));
+    EXPECT_THAT(errorOf("Selfish_Thing"), testing::HasSubstr("sent a request to itself"));
 }
 
 TEST_F(LoadingTest, AFailedFactoryIsTriedAgain) {

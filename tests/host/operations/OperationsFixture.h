@@ -44,8 +44,8 @@ protected:
         if (!started) {
             options.libraries.searchPath = {"/nonexistent", TEST_PROVIDERS};
             options.log = [this](const cimhost::LogRecord& record) {
-                log.push_back(record.text);
-                if (record.text == awaited) {
+                log.push_back(record.message);
+                if (record.message == awaited) {
                     awaited.clear();
                     whenLogged();
                 }

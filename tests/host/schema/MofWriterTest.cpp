@@ -68,7 +68,7 @@ TEST(MofWriter, NoLiteralIsLongerThanCompilersHaveRoomForAndTheTextIsReadBack) {
     }
     EXPECT_GT(literals, 5U);
     Schema schema;
-    MofReader(schema).readText("class C { string A; }; " + written, "long text");
+    MofReader(schema).readSource("class C { string A; }; " + written, "long text");
     EXPECT_EQ(std::get<std::string>(schema.instances().front().properties.front().value.elements.front()), text);
 }
 
@@ -94,9 +94,9 @@ TEST(MofWriter, TheLargestRealNumbersAreReadBack) {
         "class C { [Key] real32 A; real64 B; };"
         "instance of C { A = -3.4028234663852886e38; B = 1.7976931348623157e308; };";
     Schema schema;
-    MofReader(schema).readText(text, "numbers");
+    MofReader(schema).readSource(text, "numbers");
     const std::string written = formatMof(schema.instances().front());
-    MofReader(schema).readText(written, "again");
+    MofReader(schema).readSource(written, "again");
     const auto& again = schema.instances().back().properties;
     EXPECT_EQ(std::get<float>(again[0].value.elements[0]), -std::numeric_limits<float>::max());
     EXPECT_EQ(std::get<double>(again[1].value.elements[0]), std::numeric_limits<double>::max());

@@ -92,7 +92,7 @@ TEST(RegistrationError, NamesFileAndLine) {
 }
 
 TEST(RegistrationError, AStanzaMustSayWhichProviderInWhichLibraryServesWhichNamespace) {
-    EXPECT_THAT(refusal("[One]\nlocation: L\nnamespace: n\n"), StartsWith("test.reg:1: the stanza [One] has no line"));
+    EXPECT_THAT(refusal("[One]\nlocation: L\nnamespace: n\n"), StartsWith("test.reg:1: the section [One] has no line"));
     EXPECT_THAT(refusal("[One]\nlocation: L\nnamespace: n\n"), HasSubstr("provider: NAME"));
     EXPECT_THAT(refusal("[One]\nprovider: P\nnamespace: n\n[Two]"), HasSubstr("location: LIBRARY"));
     EXPECT_THAT(refusal("[One]\nprovider: P\nlocation: L\n"), HasSubstr("namespace: root/cimv2"));

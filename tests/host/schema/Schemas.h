@@ -16,7 +16,7 @@ namespace cimhost::test {
 /** The schema that a MOF text gives. */
 inline Schema schemaOf(const std::string& mof) {
     Schema schema;
-    MofReader(schema).readText(mof, "test.mof");
+    MofReader(schema).readSource(mof, "test.mof");
     return schema;
 }
 
@@ -24,7 +24,7 @@ inline Schema schemaOf(const std::string& mof) {
 inline std::string refusalOf(const std::string& mof) {
     Schema schema;
     try {
-        MofReader(schema).readText(mof, "test.mof");
+        MofReader(schema).readSource(mof, "test.mof");
         return "";
     } catch (const LoadError& error) {
         return error.what();

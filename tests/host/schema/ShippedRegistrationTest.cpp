@@ -51,7 +51,7 @@ protected:
     static std::vector<std::map<std::string, std::string>> instancesOf(const std::string& className) {
         Schema schema;
         MofReader reader(schema);
-        reader.readText(pegasusClasses, "pegasus");
+        reader.readSource(pegasusClasses, "pegasus");
         reader.readFile(directory / "pegasus" / (std::string(GetParam().provider) + ".mof"));
         std::vector<std::map<std::string, std::string>> found;
         for (const Instance& instance : schema.instances()) {

@@ -360,11 +360,11 @@ TEST_F(EmulationTest, AnExceptionIsAFailureEndsTheProcessOrIsUnknown) {
         return manager().perform(Request::enumerateInstances(classPath("Witness_Throwing"))).status;
     };
     as(Manager::standard);
-    EXPECT_EQ(thrown().message, "An exception left the provider: out of ink");
+    EXPECT_EQ(thrown().message, "The provider threw an exception: out of ink");
     as(Manager::sfcb);
     EXPECT_EQ(thrown().rc, CMPI_RC_ERR_FAILED);
     EXPECT_EQ(thrown().message,
-              "The manager's provider process would have died: An exception left the provider: out of ink");
+              "The manager's provider process would have died: The provider threw an exception: out of ink");
     as(Manager::openPegasus);
     EXPECT_EQ(thrown().rc, CMPI_RC_ERR_FAILED);
     EXPECT_EQ(thrown().message, "Unknown error.");

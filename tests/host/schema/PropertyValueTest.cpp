@@ -1,7 +1,7 @@
 #include <gmock/gmock.h>
 
 #include "host/schema/Schemas.h"
-#include "schema/PropertyText.h"
+#include "schema/PropertyValue.h"
 
 namespace cimhost::test {
 namespace {
@@ -20,7 +20,7 @@ const Schema& schema() {
 }
 
 Value parse(const std::string& property, const std::string& text) {
-    return parsePropertyText(text, *schema().findClass("Every")->findProperty(property), schema(), "root/cimv2");
+    return parsePropertyValue(text, *schema().findClass("Every")->findProperty(property), schema(), "root/cimv2");
 }
 
 std::string refusal(const std::string& property, const std::string& text) {
@@ -75,8 +75,8 @@ TEST(PropertyText, AnArrayIsAListInBraces) {
 
 TEST(PropertyText, AMistakeNamesThePropertyAndTheRemedy) {
     EXPECT_THAT(refusal("U8", "256"), StartsWith("U8: 256 is not a uint8: it must be an integer from 0 to 255"));
-    EXPECT_THAT(refusal("U8", ""), HasSubstr("an empty text is not a uint8"));
-    EXPECT_THAT(refusal("U8", "null"), HasSubstr("null is no uint8"));
+    EXPECT_THAT(refusal("U8", ""), HasSubstr("an empty string is not a uint8"));
+    EXPECT_THAT(refusal("U8", "null"), HasSubstr("null is not a uint8"));
     EXPECT_THAT(refusal("U8", "5x"), HasSubstr("5x is not a uint8"));
     EXPECT_THAT(refusal("Flag", "yes"), HasSubstr("true or false"));
     EXPECT_THAT(refusal("Time", "2026-01-31"), HasSubstr("25 characters"));
