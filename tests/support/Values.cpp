@@ -87,7 +87,7 @@ std::optional<std::string> textOf(const std::vector<cimhost::NamedValue>& values
 
 std::optional<std::string> dateTimeOf(const std::vector<cimhost::NamedValue>& values, const std::string& name) {
     const auto found = valueOf<cimhost::DateTime>(values, name);
-    return found ? std::optional<std::string>(found->text) : std::nullopt;
+    return found ? std::optional<std::string>(found->value) : std::nullopt;
 }
 
 std::optional<cimhost::ObjectPath> referenceOf(const std::vector<cimhost::NamedValue>& values,
