@@ -6,7 +6,7 @@
 
 #include <string>
 
-/** The broker calls that any answer is made of, without a check: the floor's requests are known to be good. */
+/** The broker calls of a response, without checks. */
 namespace bench {
 
 inline const char* characters(const CMPIString* string) {
@@ -17,21 +17,21 @@ inline const char* nameSpaceOf(const CMPIObjectPath* path) {
     return characters(path->ft->getNameSpace(path, nullptr));
 }
 
-inline std::string textKey(const CMPIObjectPath* path, const char* name) {
+inline std::string stringKey(const CMPIObjectPath* path, const char* name) {
     return characters(path->ft->getKey(path, name, nullptr).value.string);
 }
 
-/** By the convention of CMPI, a value of type CMPI_chars is the characters themselves. */
-inline const CMPIValue* charsValue(const char* text) {
-    return reinterpret_cast<const CMPIValue*>(text);
+/** In CMPI, the pointer to a value of type CMPI_chars is the pointer to its characters. */
+inline const CMPIValue* charsValue(const char* characters) {
+    return reinterpret_cast<const CMPIValue*>(characters);
 }
 
 inline CMPIObjectPath* newPath(const CMPIBroker* broker, const char* nameSpace, const char* className) {
     return broker->eft->newObjectPath(broker, nameSpace, className, nullptr);
 }
 
-inline void addKey(CMPIObjectPath* path, const char* name, const std::string& text) {
-    path->ft->addKey(path, name, charsValue(text.c_str()), CMPI_chars);
+inline void addKey(CMPIObjectPath* path, const char* name, const std::string& value) {
+    path->ft->addKey(path, name, charsValue(value.c_str()), CMPI_chars);
 }
 
 inline void addKey(CMPIObjectPath* path, const char* name, CMPIObjectPath* reference) {
@@ -40,12 +40,12 @@ inline void addKey(CMPIObjectPath* path, const char* name, CMPIObjectPath* refer
     path->ft->addKey(path, name, &value, CMPI_ref);
 }
 
-/** Sets the properties of an instance with the types that the provider gives them. */
+/** Sets the properties of an instance, with the same types as the provider. */
 class PropertySetter {
 public:
     PropertySetter(const CMPIBroker* itsBroker, CMPIInstance* itsInstance) : broker(itsBroker), instance(itsInstance) {}
 
-    void text(const char* name, const std::string& text) const { set(name, charsValue(text.c_str()), CMPI_chars); }
+    void string(const char* name, const std::string& value) const { set(name, charsValue(value.c_str()), CMPI_chars); }
 
     void number(const char* name, unsigned int number) const {
         CMPIValue value{};
@@ -59,13 +59,13 @@ public:
         set(name, &value, CMPI_boolean);
     }
 
-    /** @param text CIM datetime text; empty for null */
-    void date(const char* name, const std::string& text) const {
+    /** @param date CIM datetime; empty: null */
+    void date(const char* name, const std::string& date) const {
         CMPIValue value{};
-        if (!text.empty()) {
-            value.dateTime = broker->eft->newDateTimeFromChars(broker, text.c_str(), nullptr);
+        if (!date.empty()) {
+            value.dateTime = broker->eft->newDateTimeFromChars(broker, date.c_str(), nullptr);
         }
-        set(name, text.empty() ? nullptr : &value, CMPI_dateTime);
+        set(name, date.empty() ? nullptr : &value, CMPI_dateTime);
     }
 
 private:

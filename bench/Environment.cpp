@@ -1,4 +1,4 @@
-#include "Workbench.h"
+#include "Environment.h"
 
 #include <stdexcept>
 
@@ -7,14 +7,9 @@ namespace bench {
 namespace {
 
 cimhost::Instance computerSystem(const std::string& name) {
-    cimhost::Instance computer;
-    computer.path = classPath("VELKO_ComputerSystem");
-    computer.path.keys.push_back(textValue("Name", name));
-    computer.properties.push_back(textValue("Name", name));
-    computer.properties.push_back(textValue("ElementName", name));
-    computer.properties.push_back(textValue("Vendor", names::vendor));
-    computer.properties.push_back(textValue("Model", names::computerModel));
-    return computer;
+    return {computerPath(name),
+            {namedString("Name", name), namedString("ElementName", name), namedString("Vendor", names::vendor),
+             namedString("Model", names::computerModel)}};
 }
 
 }  // namespace
@@ -23,8 +18,8 @@ cimhost::Response ComputerSystems::perform(cimhost::Request request) {
     if (request.operation != cimhost::Operation::enumerateInstances) {
         return cimhost::notSupported(request.operation);
     }
-    if (request.path.className != "VELKO_ComputerSystem") {
-        return cimhost::Response::failed({CMPI_RC_ERR_INVALID_CLASS, "only computers are served"});
+    if (request.path.className != names::computerClass) {
+        return cimhost::Response::failed({CMPI_RC_ERR_INVALID_CLASS, "Only computers are served."});
     }
     std::vector<cimhost::Instance> instances;
     instances.push_back(computerSystem(names::computer));
@@ -34,32 +29,32 @@ cimhost::Response ComputerSystems::perform(cimhost::Request request) {
     return cimhost::Response::ofInstances(std::move(instances));
 }
 
-Workbench::Workbench(AgentStays agentStays) {
+Environment::Environment(AgentStays agentStays) {
     if (agentStays == AgentStays::yes) {
         agentLibraries.emplace();
     }
 }
 
-Interfaces Workbench::loadBoth(std::size_t size, const Entrance& entrance) {
+Interfaces Environment::loadBoth(std::size_t size, const ProviderEntry& entry) {
     unload();
     writeRows(directory.data() / LeaseRow::fileName, makeRows<LeaseRow>(size));
     writeRows(directory.data() / WarrantyRow::fileName, makeRows<WarrantyRow>(size));
-    provider.emplace(entrance, objectManager.handle());
+    provider.emplace(entry, objectManager);
     return provider->interfaces();
 }
 
-void Workbench::unload() {
+void Environment::unload() {
     provider.reset();
     gate.reset();
     content.clear();
-    std::vector<std::filesystem::path> gone{Entrance::provided().file, Entrance::gate().file};
+    std::vector<std::filesystem::path> unloaded{ProviderEntry::ofProvider().file, ProviderEntry::ofGate().file};
     if (!agentLibraries) {
         const auto agents = AgentLibraries::files();
-        gone.insert(gone.end(), agents.begin(), agents.end());
+        unloaded.insert(unloaded.end(), agents.begin(), agents.end());
     }
-    for (const std::filesystem::path& file : gone) {
-        if (SharedLibrary::isLoaded(file)) {
-            throw std::runtime_error(file.string() + " stays in the process");
+    for (const std::filesystem::path& file : unloaded) {
+        if (isLoaded(file)) {
+            throw std::runtime_error(file.string() + " was not unloaded");
         }
     }
     directory.removeRecords();

@@ -1,4 +1,4 @@
-#include "Holdings.h"
+#include "ProcessResources.h"
 
 #include <malloc.h>
 #include <unistd.h>
@@ -14,7 +14,7 @@ namespace {
 std::size_t residentBytes() {
     std::size_t pages = 0;
     std::ifstream statm("/proc/self/statm");
-    statm >> pages >> pages;  // the second number is that of resident pages
+    statm >> pages >> pages;  // the second number is the resident pages
     return pages * static_cast<std::size_t>(::sysconf(_SC_PAGESIZE));
 }
 
@@ -25,7 +25,7 @@ std::size_t entriesOf(const char* directory) {
 
 }  // namespace
 
-Holdings holdings() {
+ProcessResources processResources() {
     const struct mallinfo2 heap = ::mallinfo2();
     return {heap.uordblks + heap.hblkhd, heap.hblkhd, residentBytes(), entriesOf("/proc/self/fd"),
             entriesOf("/proc/self/task")};
