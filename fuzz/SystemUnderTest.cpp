@@ -1,4 +1,4 @@
-#include "Subject.h"
+#include "SystemUnderTest.h"
 
 #include "LeaseBase.h"
 #include "RecordFile.h"
@@ -38,7 +38,7 @@ unsigned int countOf() {
     return RecordStore::cache().count();
 }
 
-/** A table as when the library comes into the process. */
+/** Creates a table again, as when the library is loaded. */
 template <class RecordStore>
 void reload() {
     auto& cache = RecordStore::cache();
@@ -46,7 +46,7 @@ void reload() {
     new (&cache) RecordCache<RecordStore>;
 }
 
-/** What the object manager knows of computers: that of the agent; none; two, one without a name; or it fails. */
+/** Responds to enumerations of computers: the agent's computer; none; two, one without a name; or an error. */
 class Computers : public cimhost::UpCalls {
 public:
     void choose(std::size_t itsKind) { kind = itsKind % 4; }
@@ -57,7 +57,7 @@ public:
         }
         const cimhost::ObjectPath& path = request.path;
         if (kind == 3 || !cim::sameName(path.className, computerClass)) {
-            return cimhost::Response::failed({CMPI_RC_ERR_FAILED, "no computers"});
+            return cimhost::Response::failed({CMPI_RC_ERR_FAILED, "There are no computers."});
         }
         std::vector<cimhost::Instance> found;
         if (kind != 1) {
@@ -86,7 +86,7 @@ cimhost::ClassInfoLookup classes() {
     return known;
 }
 
-/** The object manager with nothing but its broker. It stays, because what is tried may keep the broker. */
+/** The broker. It is not destroyed, because the system under test may keep it. */
 struct Manager {
     static Manager& only() {
         static Manager& manager = *new Manager;
@@ -98,32 +98,26 @@ struct Manager {
     Interfaces interfaces = openInterfaces(broker.handle());
 };
 
-/** The instance that the action passes; null where it passes none. */
+/** The instance of a call; null if it has none. */
 const CMPIInstance* instanceOf(const Call& call, cimhost::RequestScope& scope) {
-    return call.instance ? scope.instance(*call.instance) : nullptr;
+    return call.hasInstance ? scope.instance(call.request.instance) : nullptr;
 }
 
-CMPIStatus perform(const Interfaces& interfaces, const Call& call, cimhost::RequestScope& scope,
-                   const CMPIContext* context, const CMPIResult* result) {
+CMPIStatus callFunction(const Interfaces& interfaces, const Call& call, cimhost::RequestScope& scope,
+                        const CMPIContext* context, const CMPIResult* result) {
     CMPIInstanceMI* const instances = interfaces.instances;
     CMPIAssociationMI* const associations = interfaces.associations;
-    const CMPIObjectPath* path = scope.objectPath(call.path);
-    cimhost::Request request;
-    request.properties = call.properties;
-    request.filter = call.filter;
-    switch (call.action) {
-        case Action::cleanup:
-            return instances->ft->cleanup(instances, context, 0);
-        case Action::associationCleanup:
-            return associations->ft->cleanup(associations, context, 0);
-        case Action::execQuery:
-            return instances->ft->execQuery(instances, context, result, path, "WQL", nullptr);
-        default:
-            request.operation = static_cast<cimhost::Operation>(call.action);
-            return cimhost::isAssociationOperation(request.operation)
-                       ? cimhost::callOperation(associations, request, context, result, path)
-                       : cimhost::callOperation(instances, request, context, result, path, instanceOf(call, scope));
+    if (call.event) {
+        return *call.event == Event::cleanup ? instances->ft->cleanup(instances, context, 0)
+                                             : associations->ft->cleanup(associations, context, 0);
     }
+    const CMPIObjectPath* path = scope.objectPath(call.request.path);
+    if (call.performs(cimhost::Operation::execQuery)) {
+        return instances->ft->execQuery(instances, context, result, path, "WQL", nullptr);
+    }
+    return cimhost::isAssociationOperation(call.request.operation)
+               ? cimhost::callOperation(associations, call.request, context, result, path)
+               : cimhost::callOperation(instances, call.request, context, result, path, instanceOf(call, scope));
 }
 
 }  // namespace
@@ -160,26 +154,26 @@ const Store* storeOf(const std::string& className) {
     return nullptr;
 }
 
-Subject::Subject(std::size_t computers) {
+SystemUnderTest::SystemUnderTest(std::size_t computers) {
     Manager::only().computers.choose(computers);
     agentEnvironment::clear();
     restart();
 }
 
-void Subject::restart() {
+void SystemUnderTest::restart() {
     reload<LeaseStoreTraits>();
     reload<WarrantyStoreTraits>();
 }
 
-cimhost::ProviderResponse Subject::make(const Call& call) {
-    if (call.action == Action::restart) {
+cimhost::ProviderResponse SystemUnderTest::perform(const Call& call) {
+    if (call.event == Event::restart) {
         restart();
         return {};
     }
     Manager& manager = Manager::only();
     return cimhost::runCall(manager.broker, {},
                             [&](cimhost::RequestScope& scope, const CMPIContext* context, const CMPIResult* result) {
-                                return perform(manager.interfaces, call, scope, context, result);
+                                return callFunction(manager.interfaces, call, scope, context, result);
                             });
 }
 
