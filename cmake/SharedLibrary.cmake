@@ -1,16 +1,22 @@
-# A GNU_UNIQUE symbol pins its library in the process for good: a provider must be able to go.
+# A GNU_UNIQUE symbol prevents the unloading of its library.
 include(CheckCXXCompilerFlag)
 check_cxx_compiler_flag(-fno-gnu-unique LAW_HAVE_NO_GNU_UNIQUE)
 
-# law_shared_library(<target> [EXPORTS <version script>])
-# Options of a library that an object manager loads: no symbol left open, nothing exported by
-# accident (with EXPORTS: exactly what the version script names), and nothing that prevents unloading.
-function(law_shared_library target)
-    cmake_parse_arguments(arg "" "EXPORTS" "" ${ARGN})
-    target_link_libraries(${target} PRIVATE law_options)
+# law_unloadable(<target>)
+# Options of the objects of a library that object managers load and unload.
+function(law_unloadable target)
     if(LAW_HAVE_NO_GNU_UNIQUE)
         target_compile_options(${target} PRIVATE -fno-gnu-unique)
     endif()
+endfunction()
+
+# law_shared_library(<target> [EXPORTS <version script>])
+# Options of a library that object managers load and unload: no undefined symbols, and no exports except those of the
+# version script.
+function(law_shared_library target)
+    cmake_parse_arguments(arg "" "EXPORTS" "" ${ARGN})
+    target_link_libraries(${target} PRIVATE law_options)
+    law_unloadable(${target})
     if(NOT LAW_SANITIZE)
         target_link_options(${target} PRIVATE -Wl,-z,defs)
     endif()
