@@ -136,7 +136,7 @@ std::vector<std::string> described(const std::vector<PropertyRow>& rows, Accepts
 cimhost::Schema readSchema() {
     cimhost::Schema read;
     const std::filesystem::path golden(CONTRACT_GOLDEN);
-    cimhost::MofReader(read).readFile(golden / "../../../../schema/velko.mof");
+    cimhost::MofReader(read).readFile(golden / "../../../schema/velko.mof");
     return read;
 }
 

@@ -3,9 +3,9 @@
 #include <functional>
 #include <string>
 
-namespace contract {
+namespace agentEnvironment {
 
-/** Replaces the agent's configuration while it exists. */
+/** Replaces the agent's configuration while it exists. The agent reads it when the framework is loaded. */
 class AgentConfiguration {
 public:
     AgentConfiguration(const AgentConfiguration&) = delete;
@@ -20,10 +20,7 @@ private:
     std::string before;
 };
 
-/**
- * Replaces the nodes of the agent's instrumentation tree by a TOML fragment while it exists. The agent reads its
- * configuration when the provider is loaded, so create the object before.
- */
+/** Replaces the nodes of the agent's instrumentation tree by a TOML fragment while it exists. */
 class AgentNodes : public AgentConfiguration {
 public:
     explicit AgentNodes(const std::string& nodes);
@@ -35,4 +32,4 @@ public:
     explicit AgentVersion(const std::string& version);
 };
 
-}  // namespace contract
+}  // namespace agentEnvironment

@@ -1,11 +1,11 @@
-#include "AgentNodes.h"
+#include "support/AgentConfiguration.h"
+
+#include <filesystem>
 
 #include "support/AgentEnvironment.h"
 #include "support/Files.h"
 
-#include <filesystem>
-
-namespace contract {
+namespace agentEnvironment {
 
 namespace {
 
@@ -16,7 +16,7 @@ const std::string beforeNodes = "discover = false\n";
 const std::string beforeVersion = "\nversion = \"";
 
 std::filesystem::path configuration() {
-    return agentEnvironment::directory() / "agent.toml";
+    return directory() / "agent.toml";
 }
 
 }  // namespace
@@ -41,4 +41,4 @@ AgentVersion::AgentVersion(const std::string& version)
           return usual.substr(0, value) + version + usual.substr(usual.find('"', value));
       }) {}
 
-}  // namespace contract
+}  // namespace agentEnvironment

@@ -312,7 +312,7 @@ path = "/system/third"
 properties = { "108" = "gamma" }
 )";
 
-    AgentNodes nodes;
+    agentEnvironment::AgentNodes nodes;
 };
 
 INSTANTIATE_TEST_SUITE_P(Kinds, AssociationNamelessTest, testing::Values(leases, warranties), associationName);

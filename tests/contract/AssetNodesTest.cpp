@@ -1,5 +1,5 @@
-#include "AgentNodes.h"
 #include "AssetFixture.h"
+#include "support/AgentConfiguration.h"
 
 #include <memory>
 
@@ -33,7 +33,7 @@ protected:
     void setNodes(const std::string& toml) {
         unload();
         nodes.reset();
-        nodes = std::make_unique<AgentNodes>(toml);
+        nodes = std::make_unique<agentEnvironment::AgentNodes>(toml);
     }
 
     /** Returns the property ProductName of a computer with this product. */
@@ -49,7 +49,7 @@ protected:
     }
 
 private:
-    std::unique_ptr<AgentNodes> nodes;
+    std::unique_ptr<agentEnvironment::AgentNodes> nodes;
 };
 
 TEST_F(AssetNodesTest, TheProductNameEndsOneCharacterBeforeTheFirstDash) {

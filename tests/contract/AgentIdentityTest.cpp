@@ -1,5 +1,5 @@
-#include "AgentNodes.h"
 #include "ProviderFixture.h"
+#include "support/AgentConfiguration.h"
 #include "support/Files.h"
 
 #include <algorithm>
@@ -146,7 +146,7 @@ TEST_F(AgentIdentityTest, ValuesAreCaseSensitive) {
 }
 
 TEST_F(AgentIdentityTest, TheVersionIsCaseSensitive) {
-    const AgentVersion version("4.2.0-Beta");
+    const agentEnvironment::AgentVersion version("4.2.0-Beta");
     EXPECT_TRUE(isTheAgent({named("Version", text("4.2.0-Beta"))}));
     for (const char* other : {"4.2.0-beta", "4.2.0-BETA", "4.2.0-Beta ", "4.2.0"}) {
         EXPECT_FALSE(isTheAgent({named("Version", text(other))})) << other;

@@ -1,7 +1,7 @@
 #pragma once
 
-#include "AgentNodes.h"
 #include "ProviderFixture.h"
+#include "support/AgentConfiguration.h"
 
 #include <ostream>
 #include <string>
@@ -96,7 +96,7 @@ protected:
     int upCalls() const { return broker.count("CMPIBrokerFT.enumerateInstances"); }
 
 private:
-    AgentNodes nodes;
+    agentEnvironment::AgentNodes nodes;
 };
 
 /** Returns the name of a parameterised test. */

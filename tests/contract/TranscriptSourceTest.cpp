@@ -15,7 +15,7 @@ namespace {
 
 namespace fs = std::filesystem;
 
-const fs::path root = fs::path(CONTRACT_GOLDEN) / "../../../..";
+const fs::path root = fs::path(CONTRACT_GOLDEN) / "../../..";
 
 /** A row of the table "Sources of line numbers". */
 struct SourceRow {
