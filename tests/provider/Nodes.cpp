@@ -1,7 +1,18 @@
-#include "support/AgentEnvironment.h"
+#include "NodesFixture.h"
 
-/** Computers with every form of product name. */
-const char* const agentNodes = R"(
+#include "framework/AgentState.h"
+
+namespace providerTest {
+
+ProcessNodes::ProcessNodes(const std::string& toml) : configuration(toml) {
+    KO::forgetAgentState();
+}
+
+ProcessNodes::~ProcessNodes() {
+    KO::forgetAgentState();
+}
+
+const char* const assetNodes = R"(
 [[instrumentation.node]]
 type = 1
 path = "/system one"
@@ -57,3 +68,32 @@ type = 40
 path = "/c9"
 properties = { "39" = "Model X - Tower" }
 )";
+
+const char* const settingNodes = R"(
+[[instrumentation.node]]
+type = 1
+path = "/system"
+properties = { "36" = "Example Maker", "108" = "the system" }
+
+[[instrumentation.node]]
+type = 40
+path = "/system/first box"
+properties = { "108" = "alpha" }
+
+[[instrumentation.node]]
+type = 40
+path = "/system/second_box"
+properties = { "108" = "beta" }
+
+[[instrumentation.node]]
+type = 40
+path = "/system/third"
+properties = { "108" = "beta" }
+
+[[instrumentation.node]]
+type = 7
+path = "/system/fan"
+properties = { "36" = "no name" }
+)";
+
+}  // namespace providerTest
