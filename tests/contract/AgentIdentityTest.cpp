@@ -15,7 +15,7 @@ using testing::ElementsAre;
 using testing::IsEmpty;
 using testsupport::named;
 using testsupport::text;
-using testsupport::textOf;
+using testsupport::stringOf;
 
 constexpr const char* className = "VELKO_OstrelAgent";
 constexpr const char* notThisAgent = "Could not find specified Agent.";
@@ -190,10 +190,10 @@ TEST_F(AgentIdentityTest, BothNamesHaveTheSuffixIfTheMarkerFileExists) {
     testsupport::writeFile(marker(), "");
     const auto instances = provider().enumerateInstances(classPath(className)).instances();
     ASSERT_EQ(instances.size(), 1U);
-    EXPECT_EQ(textOf(instances[0].properties, "Name"), "Test Agent Tarvik Agent");
-    EXPECT_EQ(textOf(instances[0].properties, "ProductName"), "Test Agent Tarvik Agent");
-    EXPECT_EQ(textOf(instances[0].path.keys, "Name"), "Test Agent Tarvik Agent");
-    EXPECT_EQ(textOf(instances[0].path.keys, "ProductName"), "Test Agent Tarvik Agent");
+    EXPECT_EQ(stringOf(instances[0].properties, "Name"), "Test Agent Tarvik Agent");
+    EXPECT_EQ(stringOf(instances[0].properties, "ProductName"), "Test Agent Tarvik Agent");
+    EXPECT_EQ(stringOf(instances[0].path.keys, "Name"), "Test Agent Tarvik Agent");
+    EXPECT_EQ(stringOf(instances[0].path.keys, "ProductName"), "Test Agent Tarvik Agent");
 }
 
 TEST_F(AgentIdentityTest, TheMarkerFileIsCheckedInEachRequest) {

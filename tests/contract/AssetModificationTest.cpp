@@ -91,7 +91,7 @@ TEST_F(AssetModificationTest, AnyStringIsReadBackUnchanged) {
                               "under_score", "*", "Null"}) {
         modify({named("PrimaryOwnerName", text(value))});
         const Instance instance = asset();
-        EXPECT_EQ(testsupport::textOf(instance.properties, "PrimaryOwnerName"), value);
+        EXPECT_EQ(testsupport::stringOf(instance.properties, "PrimaryOwnerName"), value);
     }
 }
 

@@ -11,7 +11,7 @@ namespace {
 using testing::ElementsAre;
 using testsupport::named;
 using testsupport::text;
-using testsupport::textOf;
+using testsupport::stringOf;
 
 /** Returns a node of the tree in the configuration's format. */
 std::string node(int type, const std::string& path, const std::string& properties) {
@@ -170,15 +170,15 @@ TEST_F(AssetNodesTest, EachComputerIsAnInstanceWithTheSameAssetData) {
     EXPECT_THAT(outcome, isOk(1));
     const auto instances = outcome.instances();
     ASSERT_EQ(instances.size(), 2U);
-    EXPECT_EQ(textOf(instances[0].properties, "Name"), "alpha");
-    EXPECT_EQ(textOf(instances[0].properties, "ProductName"), "Model X");
-    EXPECT_EQ(textOf(instances[1].properties, "Name"), "beta");
-    EXPECT_EQ(textOf(instances[1].properties, "CSName"), "beta");
-    EXPECT_EQ(textOf(instances[1].properties, "ProductName"), "Model Y");
+    EXPECT_EQ(stringOf(instances[0].properties, "Name"), "alpha");
+    EXPECT_EQ(stringOf(instances[0].properties, "ProductName"), "Model X");
+    EXPECT_EQ(stringOf(instances[1].properties, "Name"), "beta");
+    EXPECT_EQ(stringOf(instances[1].properties, "CSName"), "beta");
+    EXPECT_EQ(stringOf(instances[1].properties, "ProductName"), "Model Y");
     for (const Instance& instance : instances) {
-        EXPECT_EQ(textOf(instance.properties, "AssetNumber"), "A-1");
-        EXPECT_EQ(textOf(instance.properties, "Vendor"), "Example Maker");
-        EXPECT_EQ(textOf(instance.properties, "IdentifyingNumber"), "/system");
+        EXPECT_EQ(stringOf(instance.properties, "AssetNumber"), "A-1");
+        EXPECT_EQ(stringOf(instance.properties, "Vendor"), "Example Maker");
+        EXPECT_EQ(stringOf(instance.properties, "IdentifyingNumber"), "/system");
     }
     EXPECT_EQ(provider().enumerateInstanceNames(path()).paths().size(), 2U);
 }
@@ -188,7 +188,7 @@ TEST_F(AssetNodesTest, KeysSelectAmongSeveralComputers) {
              node(40, "/system/third", "\"108\" = \"alpha\""));
     const auto found = provider().getInstance(path({named("Name", text("beta"))})).instances();
     ASSERT_EQ(found.size(), 1U);
-    EXPECT_EQ(textOf(found[0].properties, "Name"), "beta");
+    EXPECT_EQ(stringOf(found[0].properties, "Name"), "beta");
     EXPECT_EQ(countWith({named("Name", text("alpha"))}), 2);
     EXPECT_EQ(countWith({named("Version", text("4.2.0"))}), 3);
     EXPECT_EQ(countWith({named("Name", text("alpha")), named("Version", text("other"))}), 0);

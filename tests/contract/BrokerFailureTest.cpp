@@ -39,7 +39,7 @@ TEST_P(BrokerFailureTest, APathThatCannotBeCreatedIsOmitted) {
         const Outcome outcome = provider().enumerateInstanceNames(allPath());
         EXPECT_THAT(outcome, isOk(1));
         EXPECT_THAT(identifiersOf(outcome.paths()), ElementsAre("A", "C"));
-        broker.obey();
+        broker.cancelFailures();
     }
 }
 
@@ -67,7 +67,7 @@ TEST_P(BrokerFailureTest, AnInstanceThatCannotBeCreatedIsOmitted) {
             const Outcome one = get("B");
             EXPECT_THAT(one, isOk(1));
             EXPECT_THAT(one.instances(), IsEmpty());
-            broker.obey();
+            broker.cancelFailures();
         }
     }
 }
@@ -89,7 +89,7 @@ TEST_P(BrokerFailureTest, ARecordIsDeletedEvenIfItsInstanceCannotBeCreated) {
     EXPECT_THAT(remove("A"), isOk(0));
     broker.failEvery(newObjectPath, brokerCode);
     EXPECT_THAT(remove("B"), isOk(0));
-    broker.obey();
+    broker.cancelFailures();
     EXPECT_EQ(data(), "0\n");
     EXPECT_THAT(loggedFailures(), IsEmpty());
 }
@@ -119,7 +119,7 @@ TEST_P(BrokerFailureTest, AKeyThatCannotBeReadSelectsNothingSoDeletionFails) {
     broker.failEvery("CMPIObjectPathFT.getKey", CMPI_RC_ERR_NOT_FOUND);
     EXPECT_THAT(identifiersOf(get("B").instances()), ElementsAre("A", "B"));
     EXPECT_THAT(remove("B"), isOk(0));
-    broker.obey();
+    broker.cancelFailures();
     EXPECT_THAT(caughtFailures(), ElementsAre(kind().identify));
     EXPECT_THAT(identifiers(), ElementsAre("A", "B"));
 }
@@ -178,7 +178,7 @@ protected:
                 }
                 agentEnvironment::forgetLog();
                 expectHarmless(request(), expected(index, isSilent), maximumDone);
-                broker.obey();
+                broker.cancelFailures();
                 after();
             }
         }

@@ -27,7 +27,7 @@ protected:
     Outcome createByData(const CMPIData& data, CMPIrc rc = CMPI_RC_OK) {
         broker.answerData(getKey, "InstanceID", data, rc);
         Outcome outcome = create("ignored");
-        broker.obey();
+        broker.cancelFailures();
         return outcome;
     }
 
@@ -187,7 +187,7 @@ TEST_P(CreateTest, TheNewInstanceHasTheNamespaceOfThePath) {
 TEST_P(CreateTest, AFailureToReadTheNamespaceIsReturnedAndTheRecordIsCreated) {
     broker.failEvery(getNameSpace, CMPI_RC_ERR_INVALID_NAMESPACE);
     const Outcome outcome = create("A");
-    broker.obey();
+    broker.cancelFailures();
     expectCreatedWithoutNamespace(outcome, CMPI_RC_ERR_INVALID_NAMESPACE);
 }
 
@@ -195,7 +195,7 @@ TEST_P(CreateTest, AFailureToReadTheNamespaceCharactersIsReturnedAndTheRecordIsC
     const int call = callForNamespace();
     broker.failCall(getCharPtr, call, CMPI_RC_ERR_FAILED);
     const Outcome outcome = create("A");
-    broker.obey();
+    broker.cancelFailures();
     expectCreatedWithoutNamespace(outcome, CMPI_RC_ERR_FAILED);
 }
 
@@ -203,14 +203,14 @@ TEST_P(CreateTest, NullNamespaceCharactersMeanTheEmptyNamespace) {
     const int call = callForNamespace();
     broker.answerNothing(getCharPtr, call);
     const Outcome outcome = create("A");
-    broker.obey();
+    broker.cancelFailures();
     expectCreatedWithoutNamespace(outcome, CMPI_RC_OK);
 }
 
 TEST_P(CreateTest, ANullNamespaceStringMeansTheEmptyNamespace) {
     broker.answerNothingEver(getNameSpace);
     const Outcome outcome = create("A");
-    broker.obey();
+    broker.cancelFailures();
     expectCreatedWithoutNamespace(outcome, CMPI_RC_OK);
 }
 
@@ -239,7 +239,7 @@ TEST_P(CreateTest, AFailureOfReturnInstanceIsIgnored) {
     EXPECT_THAT(outcome, isOk(1));
     EXPECT_THAT(outcome.events, SizeIs(1));
     EXPECT_EQ(broker.count("CMPIResultFT.returnDone"), 1);
-    broker.obey();
+    broker.cancelFailures();
     EXPECT_THAT(identifiers(), ElementsAre("A"));
     EXPECT_THAT(loggedFailures(), IsEmpty());
 }

@@ -35,7 +35,7 @@ protected:
         unload();
         const auto instances = get("A").instances();
         EXPECT_THAT(instances, SizeIs(1));
-        return testsupport::textOf(instances.at(0).properties, kind().textProperty).value_or("(none)");
+        return testsupport::stringOf(instances.at(0).properties, kind().textProperty).value_or("(none)");
     }
 };
 

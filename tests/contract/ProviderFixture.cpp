@@ -24,7 +24,7 @@ constexpr const char* entryUnit = "LeaseAndWarrantyProvider.cpp";
 constexpr int errorLevel = 3000;
 
 std::string identifierOf(const std::vector<NamedValue>& values) {
-    return testsupport::textOf(values, "InstanceID").value_or("(none)");
+    return testsupport::stringOf(values, "InstanceID").value_or("(none)");
 }
 
 /** Returns the message of a MESSAGE record; none for other records. */

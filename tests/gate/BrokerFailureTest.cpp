@@ -129,7 +129,7 @@ TEST_P(EachOperationTest, EachFunctionMayFailAtEachCall) {
             const std::string what = function + " fails at call " + std::to_string(call);
             broker.failCall(function, call, brokerCode);
             const Outcome outcome = operation();
-            broker.obey();
+            broker.cancelFailures();
             expectSaneAnswer(outcome, what);
             if (outcome.rc == CMPI_RC_OK) {
                 EXPECT_TRUE(answersOf(outcome) == good || passedOver.count(function) != 0)
@@ -149,7 +149,7 @@ TEST_P(EachOperationTest, EachFunctionMayAnswerNothingAlways) {
     for (const std::string& function : functions) {
         broker.answerNothingEver(function);
         const Outcome outcome = operation();
-        broker.obey();
+        broker.cancelFailures();
         expectSaneAnswer(outcome, function + " answers nothing");
         restore();
     }
@@ -164,7 +164,7 @@ TEST_F(BrokerFailureTest, AnAnswerThatCannotBeMadeWholeIsNotGivenInPart) {
     for (const char* maker : {"CMPIBrokerEncFT.newObjectPath", "CMPIBrokerEncFT.newInstance"}) {
         broker.failCall(maker, 2, brokerCode);
         EXPECT_THAT(gate().enumerateInstances(classPath(lease)), isRefused(CMPI_RC_ERR_FAILED, "object manager"));
-        broker.obey();
+        broker.cancelFailures();
     }
 }
 
@@ -172,10 +172,10 @@ TEST_F(BrokerFailureTest, ComputersThatCannotAllBeHadAreNoGoodAnswer) {
     const auto refused = isRefused(CMPI_RC_ERR_FAILED, "enumerate VELKO_ComputerSystem");
     broker.failCall("CMPIEnumerationFT.hasNext", 2, brokerCode);
     EXPECT_THAT(gate().associatorNames(computerPath("alpha"), {}), refused);
-    broker.obey();
+    broker.cancelFailures();
     broker.answerNothingEver("CMPIBrokerFT.enumerateInstances");
     EXPECT_THAT(gate().enumerateInstances(classPath(leaseSetting)), refused);
-    broker.obey();
+    broker.cancelFailures();
     broker.failEvery("CMPIObjectPathFT.getKeyCount", brokerCode);
     EXPECT_THAT(gate().references(keyedPath(lease, secondPlace), {}), isRefused(CMPI_RC_ERR_FAILED, "count the keys"));
     EXPECT_THAT(gate().enumerateInstances(classPath(leaseSetting)), isRefused(CMPI_RC_ERR_FAILED, "count the keys"));

@@ -81,7 +81,7 @@ const cimhost::Value* find(const std::vector<cimhost::NamedValue>& values, const
     return found == values.end() ? nullptr : &found->value;
 }
 
-std::optional<std::string> textOf(const std::vector<cimhost::NamedValue>& values, const std::string& name) {
+std::optional<std::string> stringOf(const std::vector<cimhost::NamedValue>& values, const std::string& name) {
     return valueOf<std::string>(values, name);
 }
 

@@ -45,7 +45,7 @@ TEST_F(ResultTest, KeepsWhatWasReturnedAsItWas) {
     scope.reset();
     const auto returned = eventsOf<Instance>(events);
     ASSERT_EQ(returned.size(), 1U);
-    EXPECT_EQ(testsupport::textOf(returned.front().properties, "P"), "before");
+    EXPECT_EQ(testsupport::stringOf(returned.front().properties, "P"), "before");
 }
 
 TEST_F(ResultTest, RefusesWhatIsNoObject) {

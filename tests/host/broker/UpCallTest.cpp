@@ -79,7 +79,7 @@ TEST_F(UpCallTest, AnEnumerationIsWalkedThroughOnce) {
 TEST_F(UpCallTest, ContextAndPropertyListGoAlong) {
     const char* list[] = {"A", "B", nullptr};
     up().enumerateInstances(caller(), context, newPath(), list, &status);
-    EXPECT_EQ(testsupport::textOf(echo.last.context, "Mine"), "kept");
+    EXPECT_EQ(testsupport::stringOf(echo.last.context, "Mine"), "kept");
     EXPECT_EQ(echo.last.properties, (std::vector<std::string>{"A", "B"}));
     up().enumerateInstances(caller(), nullptr, newPath(), nullptr, &status);
     EXPECT_EQ(status.rc, CMPI_RC_OK);

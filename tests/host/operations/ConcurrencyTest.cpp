@@ -11,7 +11,7 @@ namespace {
 
 using cimhost::Request;
 using cimhost::lab::Manager;
-using testsupport::textOf;
+using testsupport::stringOf;
 
 constexpr int clients = 8;
 constexpr int rounds = 25;
@@ -37,7 +37,7 @@ protected:
         const auto nested =
             manager().perform(Request::getInstance(named("Sample_Recursive", std::to_string(depth).c_str())));
         const std::string expected = std::to_string(depth) + ">Below=" + std::to_string(depth - 1);
-        EXPECT_EQ(textOf(nested.instance().properties, "Below").value_or("").substr(0, expected.size()), expected);
+        EXPECT_EQ(stringOf(nested.instance().properties, "Below").value_or("").substr(0, expected.size()), expected);
         const auto other = manager().perform(Request::enumerateInstances(classPath("Sample_CallsOther_Thing")));
         ASSERT_EQ(other.instances.size(), 1U) << other.status.message;
         EXPECT_EQ(other.instance().path.className, "Other_Thing");
@@ -49,7 +49,7 @@ protected:
         const auto far =
             manager().perform(Request::associators(named("Sample_Thing", "x"), {"Sample_Link", {}, role, {}}));
         ASSERT_EQ(far.instances.size(), 1U) << far.status.message;
-        EXPECT_EQ(textOf(far.instance().properties, "Asked"), "Sample_Link,none," + role + ",none");
+        EXPECT_EQ(stringOf(far.instance().properties, "Asked"), "Sample_Link,none," + role + ",none");
     }
 
     std::atomic<int> logged{0};

@@ -68,7 +68,7 @@ TEST_F(LoadingTest, AProviderThatWantsToStayStays) {
 TEST_F(LoadingTest, TheGenericFactoryIsToldTheName) {
     const auto found = manager().perform(Request::enumerateInstances(classPath("Other_Thing")));
     ASSERT_EQ(found.instances.size(), 1U);
-    EXPECT_EQ(testsupport::textOf(found.instance().properties, "Provider"), "Anything");
+    EXPECT_EQ(testsupport::stringOf(found.instance().properties, "Provider"), "Anything");
 }
 
 TEST_F(LoadingTest, AMissingFunctionIsNotSupported) {

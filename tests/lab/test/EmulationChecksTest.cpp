@@ -15,11 +15,11 @@ using testing::HasSubstr;
 using testing::StartsWith;
 using testsupport::text;
 
-/** A class Typed_Thing, whose provider is the witness. */
+/** A class Typed_Thing, whose provider is the echo. */
 class EmulationChecksTest : public OperationsTest {
 protected:
     EmulationChecksTest() {
-        add("Typed_Thing", "Witness", "WitnessProvider", true, false);
+        add("Typed_Thing", "Echo", "EchoProvider", true, false);
         options.classInfo = [](const std::string& name) {
             const cimhost::ClassInfo shape{"Typed_Thing",
                                            {{"Name", CMPI_string, false, true, {}},

@@ -55,7 +55,7 @@ TEST_F(EmulationLoadingTest, OfTwoFactoriesOneIsCalledOrNone) {
 }
 
 TEST_F(EmulationLoadingTest, AFunctionThatIsMissingIsMissedAtOnceOrWhenItIsCalled) {
-    EXPECT_THAT(errorOf(Manager::standard, "Lazy_Thing"), HasSubstr("functionThatNobodyHas"));
+    EXPECT_THAT(errorOf(Manager::standard, "Lazy_Thing"), HasSubstr("undefinedFunction"));
     EXPECT_EQ(errorOf(Manager::sfcb, "Lazy_Thing"), "Provider not found or not loadable");
     EXPECT_THAT(errorOf(Manager::openPegasus, "Lazy_Thing"), IsEmpty());
 }
@@ -121,20 +121,20 @@ TEST_F(EmulationLoadingTest, ALibraryIsLostWhenNobodyIsInsideAnyMore) {
 }
 
 TEST_F(EmulationLoadingTest, StoppingDoesNotWaitForWhoIsInside) {
-    add("Witness_Thing", "Witness", "WitnessProvider", true, false);
-    add("Sample_CallsWitness_Thing", "Sample", "SampleProvider", true, false);
+    add("Echo_Thing", "Echo", "EchoProvider", true, false);
+    add("Sample_CallsEcho_Thing", "Sample", "SampleProvider", true, false);
     for (const Manager each : cimhost::lab::everyManager) {
         started.reset();
         options.behaviour = cimhost::lab::emulationOf(each);
         log.clear();
-        awaited = "witness factory";
+        awaited = "echo factory";
         whenLogged = [this] {
             manager().stop();
             log.emplace_back("stopped");
         };
-        manager().perform(Request::enumerateInstances(classPath("Sample_CallsWitness_Thing")));
-        EXPECT_THAT(
-            log, testing::ElementsAre("instance factory", "witness factory", "instance cleanup at the end", "stopped"));
+        manager().perform(Request::enumerateInstances(classPath("Sample_CallsEcho_Thing")));
+        EXPECT_THAT(log,
+                    testing::ElementsAre("instance factory", "echo factory", "instance cleanup at the end", "stopped"));
         const auto late = manager().perform(Request::enumerateInstances(classPath("Sample_Thing")));
         EXPECT_EQ(late.status.rc, CMPI_RC_ERR_FAILED);
         EXPECT_EQ(late.status.message, "The object manager is stopping.");

@@ -8,12 +8,12 @@ using cimhost::lab::OperationKind;
 using cimhost::lab::percentile;
 using cimhost::lab::Report;
 using cimhost::lab::Statistics;
-using cimhost::lab::WrongAnswer;
+using cimhost::lab::WrongResponse;
 using std::chrono::microseconds;
 using testing::ElementsAre;
 using testing::Pair;
 
-WrongAnswer wrong(std::optional<unsigned> client, std::size_t number, const char* kind) {
+WrongResponse wrong(std::optional<unsigned> client, std::size_t number, const char* kind) {
     return {client, number, "request", {kind, "this", "that"}};
 }
 

@@ -4,17 +4,17 @@
 
 namespace {
 
-class HollowTest : public BrokerTest {
+class MissingCharacters : public BrokerTest {
 protected:
     CMPIInstance* instanceWith(cimhost::Value value) {
         return scope->instance({{}, {testsupport::named("Text", std::move(value))}});
     }
 
-    CMPIData textOf(const CMPIInstance* instance) { return instance->ft->getProperty(instance, "Text", &status); }
+    CMPIData get(const CMPIInstance* instance) { return instance->ft->getProperty(instance, "Text", &status); }
 };
 
-TEST_F(HollowTest, AStringMayHaveNoCharacters) {
-    const CMPIData data = textOf(instanceWith(cimhost::Value::stringWithoutCharacters()));
+TEST_F(MissingCharacters, AStringObjectMayHaveNone) {
+    const CMPIData data = get(instanceWith(cimhost::Value::stringWithoutCharacters()));
     EXPECT_EQ(status.rc, CMPI_RC_OK);
     EXPECT_EQ(data.state, CMPI_goodValue);
     ASSERT_NE(data.value.string, nullptr);
@@ -22,29 +22,29 @@ TEST_F(HollowTest, AStringMayHaveNoCharacters) {
     EXPECT_EQ(status.rc, CMPI_RC_OK);
 }
 
-TEST_F(HollowTest, ANullTextMayBeAnObject) {
-    const CMPIData data = textOf(instanceWith(cimhost::Value::nullStringObject()));
+TEST_F(MissingCharacters, ANullStringMayBeAnObject) {
+    const CMPIData data = get(instanceWith(cimhost::Value::nullStringObject()));
     EXPECT_EQ(data.state, CMPI_nullValue);
     ASSERT_NE(data.value.string, nullptr);
     EXPECT_EQ(data.value.string->ft->getCharPtr(data.value.string, nullptr), nullptr);
 }
 
-TEST_F(HollowTest, ACopyOfAHollowStringIsHollow) {
-    const CMPIData data = textOf(instanceWith(cimhost::Value::stringWithoutCharacters()));
+TEST_F(MissingCharacters, AClonedStringHasNoneEither) {
+    const CMPIData data = get(instanceWith(cimhost::Value::stringWithoutCharacters()));
     CMPIString* copy = data.value.string->ft->clone(data.value.string, nullptr);
     EXPECT_EQ(copy->ft->getCharPtr(copy, nullptr), nullptr);
     copy->ft->release(copy);
 }
 
-TEST_F(HollowTest, AHollowStringIsNullWhereItIsSet) {
-    const CMPIData data = textOf(instanceWith(cimhost::Value::stringWithoutCharacters()));
+TEST_F(MissingCharacters, APropertySetToSuchAStringIsNull) {
+    const CMPIData data = get(instanceWith(cimhost::Value::stringWithoutCharacters()));
     CMPIInstance* other = newInstance();
     EXPECT_EQ(other->ft->setProperty(other, "Text", &data.value, CMPI_string).rc, CMPI_RC_OK);
-    EXPECT_EQ(textOf(other).state, CMPI_nullValue);
-    EXPECT_EQ(textOf(other).value.string, nullptr);
+    EXPECT_EQ(get(other).state, CMPI_nullValue);
+    EXPECT_EQ(get(other).value.string, nullptr);
 }
 
-TEST_F(HollowTest, AKeyWithoutAValueIsCountedAndNotFound) {
+TEST_F(MissingCharacters, AKeyWithoutAValueIsCountedAndNotFound) {
     const CMPIObjectPath* path = scope->objectPath({{}, "root", "X", {{"Name", testsupport::nullOf(CMPI_string)}}});
     EXPECT_EQ(path->ft->getKeyCount(path, nullptr), 1U);
     const CMPIData byName = path->ft->getKey(path, "Name", &status);
@@ -55,7 +55,7 @@ TEST_F(HollowTest, AKeyWithoutAValueIsCountedAndNotFound) {
     path->ft->getKeyAt(path, 0, &name, &status);
     EXPECT_EQ(status.rc, CMPI_RC_ERR_NOT_FOUND);
     EXPECT_EQ(characters(name), "Name");
-    EXPECT_EQ(path->ft->getKey(path, "Name", nullptr).value.string, nullptr) << "a null status is no hindrance";
+    EXPECT_EQ(path->ft->getKey(path, "Name", nullptr).value.string, nullptr) << "the status may be null";
 }
 
 }  // namespace

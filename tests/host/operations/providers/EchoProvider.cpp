@@ -4,8 +4,8 @@
 
 #include "ProviderKit.h"
 
-// A provider "Witness" that remembers what it saw of the last request, to be told by enumerating Witness_Seen, and
-// whose classes each do one thing that object managers take differently.
+// The provider "Echo". Echo_Seen describes its last request. The other classes each do something that object managers
+// treat differently.
 
 namespace {
 
@@ -20,13 +20,13 @@ std::string describeText(const CMPIString* string, bool isNull) {
     const char* text = string == nullptr ? nullptr : string->ft->getCharPtr(string, nullptr);
     if (isNull) {
         return string == nullptr ? "(null)"
-               : text == nullptr ? "(hollow null)"
+               : text == nullptr ? "(null without characters)"
                                  : "(null, yet " + std::string(text) + ")";
     }
-    return text == nullptr ? "(hollow)" : text;
+    return text == nullptr ? "(without characters)" : text;
 }
 
-/** The value as text: words in parentheses for what is none. */
+/** Describes a value; in parentheses if there is none. */
 std::string describe(const CMPIData& data, const CMPIStatus& status) {
     const bool isNull = (data.state & CMPI_nullValue) != 0;
     if (status.rc != CMPI_RC_OK) {
@@ -97,41 +97,37 @@ std::string describeBroker() {
            (marks && broker->mft->cmpiMalloc == nullptr && broker->mft->freeString == nullptr ? ", only marks" : "");
 }
 
-std::string threadText() {
-    std::ostringstream text;
-    text << std::this_thread::get_id();
-    return text.str();
+std::string describeThread() {
+    std::ostringstream id;
+    id << std::this_thread::get_id();
+    return id.str();
 }
 
-CMPIInstance* told(const CMPIObjectPath* path, const std::string& text) {
+CMPIInstance* reply(const CMPIObjectPath* path, const std::string& text) {
     return kit::newInstance(broker, path, kit::className(path), "Text", text);
 }
 
-/** On which thread an up-call to the class of threads runs, seen from here. */
+/** Describes the thread of an up-call to Echo_Thread. */
 std::string describeUpCall(const CMPIContext* context, const CMPIObjectPath* path) {
-    const CMPIObjectPath* other = kit::newPath(broker, path, "Witness_Thread");
+    const CMPIObjectPath* other = kit::newPath(broker, path, "Echo_Thread");
     const CMPIEnumeration* found = broker->bft->enumerateInstances(broker, context, other, nullptr, nullptr);
     const CMPIInstance* answer = found->ft->getNext(found, nullptr).value.inst;
     const CMPIString* thread = answer->ft->getProperty(answer, "Text", nullptr).value.string;
-    return kit::characters(thread) == threadText() ? "same thread" : "another thread";
-}
-
-CMPIStatus cleanup(CMPIInstanceMI*, const CMPIContext*, CMPIBoolean) {
-    return kit::ok;
+    return kit::characters(thread) == describeThread() ? "same thread" : "another thread";
 }
 
 CMPIStatus enumerateInstances(CMPIInstanceMI*, const CMPIContext* context, const CMPIResult* result,
                               const CMPIObjectPath* path, const char** properties) {
     const std::string asked = kit::className(path);
-    if (asked == "Witness_Seen") {
-        result->ft->returnInstance(result, told(path, seen));
-    } else if (asked == "Witness_Broker") {
-        result->ft->returnInstance(result, told(path, describeBroker()));
-    } else if (asked == "Witness_Thread") {
-        result->ft->returnInstance(result, told(path, threadText()));
-    } else if (asked == "Witness_Calls") {
-        result->ft->returnInstance(result, told(path, describeUpCall(context, path)));
-    } else if (asked == "Witness_Throwing") {
+    if (asked == "Echo_Seen") {
+        result->ft->returnInstance(result, reply(path, seen));
+    } else if (asked == "Echo_Broker") {
+        result->ft->returnInstance(result, reply(path, describeBroker()));
+    } else if (asked == "Echo_Thread") {
+        result->ft->returnInstance(result, reply(path, describeThread()));
+    } else if (asked == "Echo_Calls") {
+        result->ft->returnInstance(result, reply(path, describeUpCall(context, path)));
+    } else if (asked == "Echo_Throwing") {
         throw std::runtime_error("out of ink");
     } else {
         seen = asked + "," + describe(context) + "," + describe(properties);
@@ -143,7 +139,7 @@ CMPIStatus enumerateInstances(CMPIInstanceMI*, const CMPIContext* context, const
 CMPIStatus getInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult* result, const CMPIObjectPath* path,
                        const char** properties) {
     if (kit::key(path, "Name") == "there") {
-        result->ft->returnInstance(result, told(path, "here"));
+        result->ft->returnInstance(result, reply(path, "here"));
     }
     const CMPIStatus done = result->ft->returnDone(result);
     seen = describe(path) + "," + describe(properties) + ",done " + std::to_string(done.rc) + " " +
@@ -157,13 +153,13 @@ CMPIStatus createInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*
     seen = describe(path) + " " + describe(instance);
     CMPIObjectPath* made = kit::newPath(broker, path, asked);
     kit::addKey(made, "Name", "made");
-    if (asked == "Witness_ReturnsInstance" || asked == "Witness_ReturnsBoth") {
-        seen = "instance " + std::to_string(result->ft->returnInstance(result, told(path, "an instance")).rc);
+    if (asked == "Echo_ReturnsInstance" || asked == "Echo_ReturnsBoth") {
+        seen = "instance " + std::to_string(result->ft->returnInstance(result, reply(path, "an instance")).rc);
     }
-    if (asked != "Witness_ReturnsInstance" && asked != "Witness_ReturnsNothing") {
+    if (asked != "Echo_ReturnsInstance" && asked != "Echo_ReturnsNothing") {
         result->ft->returnObjectPath(result, made);
     }
-    if (asked == "Witness_ReleasesPath") {
+    if (asked == "Echo_ReleasesPath") {
         made->ft->release(made);
     }
     return kit::ok;
@@ -175,57 +171,38 @@ CMPIStatus modifyInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*
     return kit::ok;
 }
 
-CMPIInstanceMIFT instanceTable{CMPIVersion200, CMPIVersion200, "instanceWitness", cleanup, nullptr, enumerateInstances,
-                               getInstance,    createInstance, modifyInstance,    nullptr, nullptr};
+CMPIInstanceMIFT instanceTable{
+    CMPIVersion200, CMPIVersion200, "instanceEcho", kit::cleanup, nullptr, enumerateInstances,
+    getInstance,    createInstance, modifyInstance, nullptr,      nullptr};
 CMPIInstanceMI instanceMI{nullptr, &instanceTable};
-
-CMPIStatus associationCleanup(CMPIAssociationMI*, const CMPIContext*, CMPIBoolean) {
-    return kit::ok;
-}
 
 CMPIStatus associators(CMPIAssociationMI*, const CMPIContext*, const CMPIResult* result, const CMPIObjectPath* path,
                        const char* association, const char*, const char*, const char*, const char** properties) {
-    result->ft->returnInstance(result, told(path, orNone(association) + "," + describe(properties)));
+    result->ft->returnInstance(result, reply(path, orNone(association) + "," + describe(properties)));
     return kit::ok;
 }
 
-CMPIStatus associatorNames(CMPIAssociationMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*,
-                           const char*, const char*, const char*, const char*) {
-    return {CMPI_RC_ERR_NOT_SUPPORTED, nullptr};
-}
-
-CMPIStatus references(CMPIAssociationMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*, const char*,
-                      const char*, const char**) {
-    return {CMPI_RC_ERR_NOT_SUPPORTED, nullptr};
-}
-
-CMPIStatus referenceNames(CMPIAssociationMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*, const char*,
-                          const char*) {
-    return {CMPI_RC_ERR_NOT_SUPPORTED, nullptr};
-}
-
-CMPIAssociationMIFT associationTable{CMPIVersion200, CMPIVersion200,  "associationWitness", associationCleanup,
-                                     associators,    associatorNames, references,           referenceNames};
+CMPIAssociationMIFT associationTable{CMPIVersion200, CMPIVersion200,         "associationEcho", kit::cleanup,
+                                     associators,    kit::noAssociatorNames, kit::noReferences, kit::noReferenceNames};
 CMPIAssociationMI associationMI{nullptr, &associationTable};
 
 }  // namespace
 
-KIT_EXPORT CMPIInstanceMI* Witness_Create_InstanceMI(const CMPIBroker* itsBroker, const CMPIContext*, CMPIStatus*) {
-    kit::keep(broker, itsBroker);
-    kit::log(broker, "witness factory");
+KIT_EXPORT CMPIInstanceMI* Echo_Create_InstanceMI(const CMPIBroker* itsBroker, const CMPIContext*, CMPIStatus*) {
+    kit::store(broker, itsBroker);
+    kit::log(broker, "echo factory");
     return &instanceMI;
 }
 
-/** Asks the class of threads for an instance while it starts. */
+/** Enumerates Echo_Calls in its factory. */
 KIT_EXPORT CMPIInstanceMI* Curious_Create_InstanceMI(const CMPIBroker* itsBroker, const CMPIContext* context,
                                                      CMPIStatus* status) {
-    const CMPIObjectPath* path = itsBroker->eft->newObjectPath(itsBroker, "root/cimv2", "Witness_Calls", nullptr);
+    const CMPIObjectPath* path = itsBroker->eft->newObjectPath(itsBroker, "root/cimv2", "Echo_Calls", nullptr);
     itsBroker->bft->enumerateInstances(itsBroker, context, path, nullptr, status);
     return &instanceMI;
 }
 
-KIT_EXPORT CMPIAssociationMI* Witness_Create_AssociationMI(const CMPIBroker* itsBroker, const CMPIContext*,
-                                                           CMPIStatus*) {
-    kit::keep(broker, itsBroker);
+KIT_EXPORT CMPIAssociationMI* Echo_Create_AssociationMI(const CMPIBroker* itsBroker, const CMPIContext*, CMPIStatus*) {
+    kit::store(broker, itsBroker);
     return &associationMI;
 }

@@ -1,4 +1,4 @@
-#include "lab/load/Baseline.h"
+#include "lab/load/InitialState.h"
 
 #include <algorithm>
 
@@ -8,7 +8,7 @@
 namespace cimhost::lab {
 namespace {
 
-/** A beginning that no identifier there is has. */
+/** A prefix that no existing identifier has. */
 std::string freePrefix(const Plan& plan, const std::vector<std::set<std::string>>& ids) {
     std::string prefix = "load" + std::to_string(plan.seed) + "-";
     const auto isTaken = [&](const std::set<std::string>& each) {
@@ -43,27 +43,27 @@ std::vector<std::string> associated(const Response& response, const std::string&
     return paths;
 }
 
-StatusOr<Baseline> takeBaseline(ObjectManager& manager, const Plan& plan) {
-    Baseline baseline;
+StatusOr<InitialState> readInitialState(ObjectManager& manager, const Plan& plan) {
+    InitialState initial;
     for (const LoadClass& each : plan.classes) {
         const Response found = manager.perform(Request::enumerateInstanceNames(each.path));
         if (!found.ok()) {
             return {found.status, {}};
         }
-        std::set<std::string>& ids = baseline.ids.emplace_back();
+        std::set<std::string>& ids = initial.ids.emplace_back();
         for (const ObjectPath& path : found.paths) {
             ids.insert(each.idIn(path.keys).value_or(std::string{}));
         }
     }
-    baseline.prefix = freePrefix(plan, baseline.ids);
+    initial.prefix = freePrefix(plan, initial.ids);
     for (std::size_t i = 0; plan.source && i < associationOperations.size(); ++i) {
         const Response found = manager.perform(associationRequest(associationOperations[i], plan));
         if (!found.ok() && found.status.rc != CMPI_RC_ERR_NOT_SUPPORTED) {
             return {found.status, {}};
         }
-        baseline.associated[i] = {found.status.rc, associated(found, baseline.prefix)};
+        initial.associated[i] = {found.status.rc, associated(found, initial.prefix)};
     }
-    return {{}, std::move(baseline)};
+    return {{}, std::move(initial)};
 }
 
 }  // namespace cimhost::lab

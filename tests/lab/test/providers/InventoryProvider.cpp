@@ -5,8 +5,8 @@
 
 #include "host/operations/providers/ProviderKit.h"
 
-// A provider "Depot" that takes many requests at a time and answers them rightly, but for classes that each go wrong in
-// one way: Depot_Liar, Depot_Hoarder and so on. Every class has a store of its own.
+// The provider "Inventory", which supports concurrent requests. Some of its classes each have one defect:
+// Inventory_Liar, Inventory_Hoarder and so on. Each class has a separate store.
 
 namespace {
 
@@ -21,10 +21,10 @@ using Store = std::map<std::string, Item>;
 const CMPIBroker* broker = nullptr;
 std::mutex mutex;
 std::map<std::string, Store> stores;  ///< by class
-std::map<std::string, int> turns;     ///< how often something was asked of a class
+std::map<std::string, int> turns;     ///< number of requests per class
 
-/** Whether the class goes wrong now: it is that one, and does so every third time, so not at the very first. */
-bool goesWrong(const std::string& asked, const char* className) {
+/** Whether the defect of a class applies to this request: to every third one. */
+bool isDefective(const std::string& asked, const char* className) {
     return asked == className && ++turns[asked] % 3 == 0;
 }
 
@@ -54,7 +54,7 @@ CMPIInstance* instanceOf(const CMPIObjectPath* like, const std::string& asked, c
     return instance;
 }
 
-/** The value of a property; none when it is not there or null. */
+/** The value of a property; none if it is missing or null. */
 std::optional<CMPIValue> valueOf(const CMPIInstance* instance, const char* name) {
     CMPIStatus status = kit::ok;
     const CMPIData data = instance->ft->getProperty(instance, name, &status);
@@ -74,25 +74,21 @@ void apply(Item& item, const CMPIInstance* instance) {
     }
 }
 
-/** The key from the path or, where that has none, from the instance. */
+/** The key of the path or, if it has none, of the instance. */
 std::string nameOf(const CMPIObjectPath* path, const CMPIInstance* instance) {
     const std::string name = kit::key(path, "Name");
     const auto inInstance = valueOf(instance, "Name");
     return name.empty() && inInstance ? kit::characters(inInstance->string) : name;
 }
 
-CMPIStatus cleanup(CMPIInstanceMI*, const CMPIContext*, CMPIBoolean) {
-    return kit::ok;
-}
-
-/** What a class shows: what it has, or more, or less. */
+/** The instances that a class returns: those of its store, or more, or fewer. */
 Store shownBy(const std::string& asked) {
     Store shown = stores[asked];
-    if (asked == "Depot_Forgetful") {
+    if (asked == "Inventory_Forgetful") {
         shown.clear();
-    } else if (goesWrong(asked, "Depot_Inventive")) {
+    } else if (isDefective(asked, "Inventory_Inventive")) {
         shown["nobody's"] = {};
-    } else if (goesWrong(asked, "Depot_Nameless")) {
+    } else if (isDefective(asked, "Inventory_Nameless")) {
         shown[""] = {};
     }
     return shown;
@@ -107,7 +103,7 @@ CMPIStatus enumerate(const CMPIResult* result, const CMPIObjectPath* path, Retur
         shown = shownBy(asked);
     }
     for (const auto& [name, item] : shown) {
-        for (int times = asked == "Depot_Repeating" ? 2 : 1; times > 0; --times) {
+        for (int times = asked == "Inventory_Repeating" ? 2 : 1; times > 0; --times) {
             returnOne(instanceOf(path, asked, name, item));
         }
     }
@@ -137,7 +133,7 @@ CMPIStatus getInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult* re
         return {CMPI_RC_ERR_NOT_FOUND, nullptr};
     }
     Item item = found->second;
-    if (asked == "Depot_Liar") {
+    if (asked == "Inventory_Liar") {
         item.number = item.number.value_or(0) + 1;
     }
     result->ft->returnInstance(result, instanceOf(path, asked, found->first, item));
@@ -150,15 +146,15 @@ CMPIStatus createInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*
     const std::string asked = kit::className(path);
     const std::string name = nameOf(path, instance);
     const std::lock_guard<std::mutex> lock(mutex);
-    if (asked == "Depot_Throwing") {
+    if (asked == "Inventory_Throwing") {
         throw std::runtime_error("full");
     }
-    if (!stores[asked].emplace(name, Item{}).second && asked != "Depot_Generous") {
+    if (!stores[asked].emplace(name, Item{}).second && asked != "Inventory_Generous") {
         return {CMPI_RC_ERR_ALREADY_EXISTS, nullptr};
     }
     apply(stores[asked][name], instance);
-    if (asked != "Depot_Silent") {
-        result->ft->returnObjectPath(result, pathOf(path, asked, asked == "Depot_Misnaming" ? "other" : name));
+    if (asked != "Inventory_Silent") {
+        result->ft->returnObjectPath(result, pathOf(path, asked, asked == "Inventory_Misnaming" ? "other" : name));
     }
     return kit::ok;
 }
@@ -170,7 +166,7 @@ CMPIStatus modifyInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*
     Store& store = stores[asked];
     const auto found = store.find(kit::key(path, "Name"));
     if (found == store.end()) {
-        return {asked == "Depot_Polite" ? CMPI_RC_OK : CMPI_RC_ERR_NOT_FOUND, nullptr};
+        return {asked == "Inventory_Polite" ? CMPI_RC_OK : CMPI_RC_ERR_NOT_FOUND, nullptr};
     }
     apply(found->second, instance);
     return kit::ok;
@@ -179,74 +175,69 @@ CMPIStatus modifyInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*
 CMPIStatus deleteInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath* path) {
     const std::string asked = kit::className(path);
     const std::lock_guard<std::mutex> lock(mutex);
-    if (asked == "Depot_Hoarder") {
+    if (asked == "Inventory_Hoarder") {
         return kit::ok;
     }
     return stores[asked].erase(kit::key(path, "Name")) == 0 ? CMPIStatus{CMPI_RC_ERR_NOT_FOUND, nullptr} : kit::ok;
 }
 
-CMPIInstanceMIFT instanceTable{CMPIVersion200,         CMPIVersion200,     "instanceDepot", cleanup,
-                               enumerateInstanceNames, enumerateInstances, getInstance,     createInstance,
-                               modifyInstance,         deleteInstance,     nullptr};
+CMPIInstanceMIFT instanceTable{CMPIVersion200,
+                               CMPIVersion200,
+                               "instanceInventory",
+                               kit::cleanup,
+                               enumerateInstanceNames,
+                               enumerateInstances,
+                               getInstance,
+                               createInstance,
+                               modifyInstance,
+                               deleteInstance,
+                               nullptr};
 CMPIInstanceMI instanceMI{nullptr, &instanceTable};
 
-// Associations: from anywhere to the gates of the depot, of which there are two; Depot_Wandering loses one at times.
-
-CMPIStatus associationCleanup(CMPIAssociationMI*, const CMPIContext*, CMPIBoolean) {
-    return kit::ok;
-}
+// Associations: from any instance to two instances of Inventory_Gate; Inventory_Wandering sometimes omits one.
 
 int gatesOf(const char* association) {
     const std::lock_guard<std::mutex> lock(mutex);
-    return association != nullptr && goesWrong(association, "Depot_Wandering") ? 1 : 2;
+    return association != nullptr && isDefective(association, "Inventory_Wandering") ? 1 : 2;
 }
 
-/** Asks the object manager for the class of things first, as providers of associations do. */
-void askBack(const CMPIContext* context, const CMPIObjectPath* path) {
-    broker->bft->enumerateInstanceNames(broker, context, kit::newPath(broker, path, "Depot_Thing"), nullptr);
+/** Enumerates Inventory_Thing, since providers of associations send requests. */
+void sendUpCall(const CMPIContext* context, const CMPIObjectPath* path) {
+    broker->bft->enumerateInstanceNames(broker, context, kit::newPath(broker, path, "Inventory_Thing"), nullptr);
 }
 
 CMPIStatus associators(CMPIAssociationMI*, const CMPIContext* context, const CMPIResult* result,
                        const CMPIObjectPath* path, const char* association, const char*, const char*, const char*,
                        const char**) {
-    askBack(context, path);
+    sendUpCall(context, path);
     for (int gate = gatesOf(association); gate > 0; --gate) {
-        result->ft->returnInstance(result, instanceOf(path, "Depot_Gate", std::to_string(gate), {}));
+        result->ft->returnInstance(result, instanceOf(path, "Inventory_Gate", std::to_string(gate), {}));
     }
     return kit::ok;
 }
 
 CMPIStatus associatorNames(CMPIAssociationMI*, const CMPIContext* context, const CMPIResult* result,
                            const CMPIObjectPath* path, const char* association, const char*, const char*, const char*) {
-    askBack(context, path);
+    sendUpCall(context, path);
     for (int gate = gatesOf(association); gate > 0; --gate) {
-        result->ft->returnObjectPath(result, pathOf(path, "Depot_Gate", std::to_string(gate)));
+        result->ft->returnObjectPath(result, pathOf(path, "Inventory_Gate", std::to_string(gate)));
     }
     return kit::ok;
 }
 
-CMPIStatus references(CMPIAssociationMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*, const char*,
-                      const char*, const char**) {
-    return {CMPI_RC_ERR_NOT_SUPPORTED, nullptr};
-}
-
-CMPIStatus referenceNames(CMPIAssociationMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*, const char*,
-                          const char*) {
-    return {CMPI_RC_ERR_NOT_SUPPORTED, nullptr};
-}
-
-CMPIAssociationMIFT associationTable{CMPIVersion200, CMPIVersion200,  "associationDepot", associationCleanup,
-                                     associators,    associatorNames, references,         referenceNames};
+CMPIAssociationMIFT associationTable{CMPIVersion200, CMPIVersion200,  "associationInventory", kit::cleanup,
+                                     associators,    associatorNames, kit::noReferences,      kit::noReferenceNames};
 CMPIAssociationMI associationMI{nullptr, &associationTable};
 
 }  // namespace
 
-KIT_EXPORT CMPIInstanceMI* Depot_Create_InstanceMI(const CMPIBroker* itsBroker, const CMPIContext*, CMPIStatus*) {
-    kit::keep(broker, itsBroker);
+KIT_EXPORT CMPIInstanceMI* Inventory_Create_InstanceMI(const CMPIBroker* itsBroker, const CMPIContext*, CMPIStatus*) {
+    kit::store(broker, itsBroker);
     return &instanceMI;
 }
 
-KIT_EXPORT CMPIAssociationMI* Depot_Create_AssociationMI(const CMPIBroker* itsBroker, const CMPIContext*, CMPIStatus*) {
-    kit::keep(broker, itsBroker);
+KIT_EXPORT CMPIAssociationMI* Inventory_Create_AssociationMI(const CMPIBroker* itsBroker, const CMPIContext*,
+                                                             CMPIStatus*) {
+    kit::store(broker, itsBroker);
     return &associationMI;
 }
