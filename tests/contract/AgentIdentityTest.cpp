@@ -14,8 +14,8 @@ namespace fs = std::filesystem;
 using testing::ElementsAre;
 using testing::IsEmpty;
 using testsupport::named;
-using testsupport::text;
 using testsupport::stringOf;
+using testsupport::text;
 
 constexpr const char* className = "VELKO_OstrelAgent";
 constexpr const char* notThisAgent = "Could not find specified Agent.";

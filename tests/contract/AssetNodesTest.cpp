@@ -10,8 +10,8 @@ namespace {
 
 using testing::ElementsAre;
 using testsupport::named;
-using testsupport::text;
 using testsupport::stringOf;
+using testsupport::text;
 
 /** Returns a node of the tree in the configuration's format. */
 std::string node(int type, const std::string& path, const std::string& properties) {

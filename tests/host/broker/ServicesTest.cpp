@@ -28,7 +28,7 @@ TEST_F(ServicesTest, KnowsTheTypesOfObjects) {
     EXPECT_EQ(status.rc, CMPI_RC_OK);
 }
 
-TEST_F(ServicesTest, WritesObjectsAsText) {
+TEST_F(ServicesTest, DescribesObjects) {
     EXPECT_EQ(characters(make().toString(handle(), newString("s"), nullptr)), "s");
     EXPECT_EQ(characters(make().toString(handle(), newPath("C"), nullptr)), "root/cimv2:C");
     CMPIInstance* instance = newInstance("C");
@@ -126,7 +126,7 @@ TEST_F(ServicesTest, AThreadCanExit) {
     EXPECT_EQ(answer, &threads);
 }
 
-/** What two threads share. */
+/** Shared by two threads. */
 struct Meeting {
     const CMPIBrokerExtFT* threads;
     void* mutex;

@@ -29,7 +29,7 @@ TEST(Location, OptionsComeBeforeTheEnvironment) {
     EXPECT_THAT(listed.output, AllOf(StartsWith("Other "), HasSubstr("Test_Box"), HasSubstr("(not in the schema)")));
 }
 
-TEST(Location, ADirectoryStandsForItsFilesAndSeveralMayBeNamed) {
+TEST(Location, ADirectoryMeansItsFilesAndSeveralCanBeNamed) {
     const TemporaryDirectory directory;
     directory.write("a/2.mof", "class Two : One {};");
     directory.write("a/1.mof", "class One { [Key] string K; };");

@@ -17,7 +17,7 @@ void PrintTo(const Misspelt& line, std::ostream* out) {
 }
 
 class Misspelling : public testing::TestWithParam<Misspelt> {};
-TEST_P(Misspelling, IsAnsweredWithWhatWasPerhapsMeant) {
+TEST_P(Misspelling, IsReportedWithASuggestion) {
     const Ended refused = run(GetParam().arguments);
     EXPECT_NE(refused.status, 0);
     EXPECT_THAT(refused.error, HasSubstr(std::string("did you mean ") + GetParam().suggestion + "?"));
@@ -31,7 +31,7 @@ INSTANTIATE_TEST_SUITE_P(
                     Misspelt{{"ain", "Test_Box.Name=\"A\"", "--assoc-class", "Test_Contain"}, "Test_Contains"},
                     Misspelt{{"mi", "Test_Box.Name=\"A\"", "Sizes=1"}, "Size"}));
 
-TEST(Suggestion, IsNotMadeWhereNothingIsNear) {
+TEST(Suggestion, IsNotMadeIfNothingIsSimilar) {
     EXPECT_THAT(run({"frobnicate"}).error, Not(HasSubstr("did you mean")));
     EXPECT_THAT(run({"ei", "Nothing_Like_It"}).error, Not(HasSubstr("did you mean")));
     EXPECT_THAT(run({"mi", "Test_Box.Name=\"A\"", "Frobnicated=1"}).error, Not(HasSubstr("did you mean")));

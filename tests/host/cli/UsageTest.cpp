@@ -19,7 +19,7 @@ TEST(Help, ShowsCommandsOptionsAndExamples) {
     }
 }
 
-TEST(Help, EveryCommandHasItsOwn) {
+TEST(Help, EachCommandHasHelp) {
     for (const char* command : {"ei", "ein", "gi", "ci", "mi", "di", "ai", "ain", "ri", "rin", "classes"}) {
         const Ended help = runBare({command, "--help"});
         EXPECT_EQ(help.status, 0) << command;

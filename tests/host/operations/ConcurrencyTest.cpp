@@ -5,7 +5,7 @@
 #include "lab/emulation/ManagerEmulation.h"
 
 // Many clients at a time, as every manager: providers are started, ask each other, fail and throw, and every client
-// gets the answers to its own requests.
+// receives the responses to its own requests.
 
 namespace {
 
@@ -22,7 +22,7 @@ protected:
 
     void TearDown() override { started.reset(); }  // while there is something to log to
 
-    /** The manager, with a log that takes lines from several threads. */
+    /** The manager, with a thread-safe log. */
     cimhost::ObjectManager& shared() {
         if (!started) {
             options.libraries.searchPath = {TEST_PROVIDERS};
@@ -55,7 +55,7 @@ protected:
     std::atomic<int> logged{0};
 };
 
-TEST_P(ConcurrencyTest, EveryClientGetsItsOwnAnswers) {
+TEST_P(ConcurrencyTest, EachClientReceivesItsOwnResponses) {
     shared();
     std::vector<std::thread> threads;
     for (int client = 0; client < clients; ++client) {

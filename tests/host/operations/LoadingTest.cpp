@@ -15,7 +15,7 @@ class LoadingTest : public OperationsTest {
 protected:
     void ask(const char* className) { manager().perform(Request::enumerateInstances(classPath(className))); }
 
-    /** The text of the LibraryError that asking for a class ends with; empty when it does not. */
+    /** The message of the LibraryError of a request for a class; empty if there is none. */
     std::string errorOf(const char* className) {
         try {
             ask(className);
@@ -65,7 +65,7 @@ TEST_F(LoadingTest, AProviderThatWantsToStayStays) {
     EXPECT_TRUE(isLoaded("libOtherProvider.so"));
 }
 
-TEST_F(LoadingTest, TheGenericFactoryIsToldTheName) {
+TEST_F(LoadingTest, TheGenericFactoryReceivesTheName) {
     const auto found = manager().perform(Request::enumerateInstances(classPath("Other_Thing")));
     ASSERT_EQ(found.instances.size(), 1U);
     EXPECT_EQ(testsupport::stringOf(found.instance().properties, "Provider"), "Anything");
@@ -132,7 +132,7 @@ TEST_F(LoadingTest, ALaterRegistrationReplacesAnEarlierOne) {
     EXPECT_EQ(found.instance().path.className, "Other_Thing");
 }
 
-TEST_F(LoadingTest, AnInterfaceRefusesOperationsOfTheOtherKind) {
+TEST_F(LoadingTest, AnInterfaceRejectsOperationsOfTheOtherKind) {
     cimhost::Request request;
     request.operation = cimhost::Operation::associators;
     CMPIInstanceMI none{};

@@ -5,8 +5,8 @@ namespace {
 using cimhost::Instance;
 using cimhost::ObjectPath;
 using cimhost::Request;
-using testsupport::text;
 using testsupport::stringOf;
+using testsupport::text;
 
 class ObjectManagerTest : public OperationsTest {
 protected:
@@ -71,13 +71,13 @@ TEST_F(ObjectManagerTest, ModifyHandsOverExactlyTheProperties) {
     EXPECT_EQ(stringOf(found.instance().properties, "Text"), "Colour=blue;");
 }
 
-TEST_F(ObjectManagerTest, AFailureWithoutAMessageGetsOne) {
+TEST_F(ObjectManagerTest, AFailureWithoutAMessageReceivesOne) {
     const auto status = manager().perform(Request::deleteInstance(named("Sample_Thing", "missing"))).status;
     EXPECT_EQ(status.rc, CMPI_RC_ERR_NOT_FOUND);
     EXPECT_FALSE(status.message.empty());
 }
 
-TEST_F(ObjectManagerTest, AFailureKeepsItsMessageAndGivesNoResults) {
+TEST_F(ObjectManagerTest, AFailureHasItsMessageAndNoResults) {
     const auto found = manager().perform(Request::enumerateInstances(classPath("Sample_Failing")));
     EXPECT_EQ(found.status.rc, CMPI_RC_ERR_ACCESS_DENIED);
     EXPECT_EQ(found.status.message, "not for you");
@@ -111,7 +111,7 @@ TEST_F(ObjectManagerTest, ResultsOfTheWrongKindAreAFailure) {
     EXPECT_THAT(names.status.message, testing::HasSubstr("EnumerateInstanceNames"));
 }
 
-TEST_F(ObjectManagerTest, APropertyListGoesToTheProvider) {
+TEST_F(ObjectManagerTest, APropertyListReachesTheProvider) {
     create("Sample_Thing", "g");
     const auto found = manager().perform(
         Request::enumerateInstances(classPath("Sample_Thing"), std::vector<std::string>{"Wanted", "Also"}));
@@ -128,7 +128,7 @@ TEST_F(ObjectManagerTest, CompletesTheContext) {
     EXPECT_EQ(stringOf(own.instance().properties, "Name"), "root/cimv2;anna;4");
 }
 
-TEST_F(ObjectManagerTest, OptionsGiveEveryRequestContextEntries) {
+TEST_F(ObjectManagerTest, OptionsAddContextEntriesToEachRequest) {
     options.context = {testsupport::named(CMPIPrincipal, text("daemon"))};
     const auto found = manager().perform(Request::enumerateInstances(classPath("Sample_Context")));
     EXPECT_EQ(stringOf(found.instance().properties, "Name"), "root/cimv2;daemon;0");
@@ -143,7 +143,7 @@ TEST_F(ObjectManagerTest, AnExceptionOfAProviderIsAFailure) {
     EXPECT_TRUE(manager().perform(Request::enumerateInstances(classPath("Sample_Thing"))).ok()) << "life goes on";
 }
 
-TEST_F(ObjectManagerTest, TheResponseHasEverythingThatTheProviderDid) {
+TEST_F(ObjectManagerTest, TheResponseHasTheProvidersResponse) {
     cimhost::Request request;
     request.path = classPath("Sample_Failing");
     auto failing = manager().perform(request);
@@ -182,7 +182,7 @@ TEST_F(ObjectManagerTest, UpCallsNest) {
     EXPECT_EQ(stringOf(found.instance().properties, "Below"), "3>Below=2>Below=1>Below=0>bottom;;;");
 }
 
-TEST_F(ObjectManagerTest, AFailingUpCallTellsTheCaller) {
+TEST_F(ObjectManagerTest, AFailingUpCallReturnsItsStatus) {
     const auto missing = manager().perform(Request::enumerateInstances(classPath("Sample_CallsMissing")));
     EXPECT_EQ(missing.status.rc, CMPI_RC_ERR_INVALID_CLASS);
     EXPECT_THAT(missing.status.message, testing::HasSubstr("Missing"));
@@ -203,14 +203,14 @@ TEST_F(ObjectManagerTest, AssociationsGoByTheirClass) {
     EXPECT_EQ(stringOf(found.instance().properties, "Asked"), "sample_link,Far,Here,none");
 }
 
-TEST_F(ObjectManagerTest, WithoutAClassAllAssociationsAreAsked) {
+TEST_F(ObjectManagerTest, WithoutAClassAllAssociationsAreCalled) {
     const auto found = manager().perform(Request::associatorNames(named("Sample_Thing", "x"), {}));
     ASSERT_EQ(found.paths.size(), 2U);
     EXPECT_EQ(stringOf(found.paths[0].keys, "Asked"), "Sample_Link");
     EXPECT_EQ(stringOf(found.paths[1].keys, "Asked"), "Sample_OtherLink");
 }
 
-TEST_F(ObjectManagerTest, ASuperclassStandsForItsAssociations) {
+TEST_F(ObjectManagerTest, ASuperclassMeansItsAssociations) {
     auto shape = std::make_shared<cimhost::ClassInfo>();
     shape->name = "Sample_OtherLink";
     shape->superclasses = {"Sample_AnyLink"};

@@ -39,7 +39,7 @@ protected:
         registry.add(registration);
     }
 
-    /** Starts the manager at the first need, with all that was added until then. */
+    /** The first call creates the manager, with the classes added until then. */
     cimhost::ObjectManager& manager() {
         if (!started) {
             options.libraries.searchPath = {"/nonexistent", TEST_PROVIDERS};
@@ -63,8 +63,8 @@ protected:
         return testsupport::objectPath("root/cimv2", className, {testsupport::named("Name", testsupport::text(name))});
     }
 
-    std::string awaited;               ///< at which text whenLogged is called, once
-    std::function<void()> whenLogged;  ///< inside of the provider's call
+    std::string awaited;               ///< the message at which whenLogged is called, once
+    std::function<void()> whenLogged;  ///< called inside the provider's call
 
     std::vector<std::string> log;  ///< what providers logged; outlives the manager, whose end is logged too
     cimhost::ObjectManagerOptions options;

@@ -13,8 +13,8 @@ using testsupport::objectPath;
 using testsupport::Outcome;
 using testsupport::ProviderLibrary;
 using testsupport::RecordingBroker;
-using testsupport::text;
 using testsupport::stringOf;
+using testsupport::text;
 
 class ProviderLibraryTest : public testing::Test {
 protected:
@@ -64,7 +64,7 @@ TEST_F(ProviderLibraryTest, RunsEveryAssociationOperation) {
     EXPECT_EQ(provider.cleanupAssociationMI(false).rc, CMPI_RC_OK);
 }
 
-TEST_F(ProviderLibraryTest, TellsMessagesAndExceptions) {
+TEST_F(ProviderLibraryTest, ReportsMessagesAndExceptions) {
     const Outcome failing = provider.enumerateInstances(objectPath("root/cimv2", "Sample_Failing"));
     EXPECT_EQ(failing.rc, CMPI_RC_ERR_ACCESS_DENIED);
     EXPECT_TRUE(failing.hasMessage);
@@ -109,7 +109,7 @@ TEST_F(ProviderLibraryTest, RunsAnyCall) {
     EXPECT_EQ(outcome.rc, CMPI_RC_ERR_NOT_FOUND);
 }
 
-TEST_F(ProviderLibraryTest, TellsWhatCannotBeLoaded) {
+TEST_F(ProviderLibraryTest, ReportsMissingLibrariesAndFactories) {
     EXPECT_THROW(ProviderLibrary("/nonexistent/libNone.so", "None", broker), cimhost::LibraryError);
     ProviderLibrary wrong(TEST_PROVIDERS "/libSampleProvider.so", "Wrong", broker);
     EXPECT_THROW(wrong.instanceMI(), cimhost::LibraryError);

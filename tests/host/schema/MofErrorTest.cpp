@@ -12,7 +12,7 @@ using testing::StartsWith;
 struct BadMof {
     const char* name;
     const char* text;
-    const char* place;     ///< line:column
+    const char* position;  ///< line:column
     const char* expected;  ///< part of the message
 };
 
@@ -22,9 +22,9 @@ void PrintTo(const BadMof& bad, std::ostream* out) {
 
 class MofError : public testing::TestWithParam<BadMof> {};
 
-TEST_P(MofError, SaysWhereAndWhatWasExpected) {
+TEST_P(MofError, HasAPositionAndTheExpectation) {
     const std::string message = refusalOf(GetParam().text);
-    EXPECT_THAT(message, StartsWith("test.mof:" + std::string(GetParam().place) + ": "));
+    EXPECT_THAT(message, StartsWith("test.mof:" + std::string(GetParam().position) + ": "));
     EXPECT_THAT(message, HasSubstr(GetParam().expected));
 }
 
@@ -147,7 +147,7 @@ TEST(MofFile, AnEmptyFileIsGood) {
     EXPECT_TRUE(schema.classes().empty());
 }
 
-TEST(MofText, ATextWithASyntaxErrorAddsNothing) {
+TEST(MofSource, ASourceWithASyntaxErrorAddsNothing) {
     Schema schema;
     EXPECT_THROW(MofReader(schema).readSource("class A {}; class {", "x"), LoadError);
     EXPECT_EQ(schema.findClass("A"), nullptr);

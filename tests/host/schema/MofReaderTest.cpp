@@ -10,7 +10,7 @@ Value defaultOf(const std::string& declaration) {
     return schema.findClass("C")->properties.at(0).defaultValue;
 }
 
-TEST(MofReader, AnEmptyTextAndOneOfCommentsGiveNothing) {
+TEST(MofReader, NothingAndCommentsDeclareNothing) {
     EXPECT_TRUE(schemaOf("").classes().empty());
     EXPECT_TRUE(schemaOf("// one\n/* two\n * lines */ // at the end").classes().empty());
     EXPECT_TRUE(schemaOf("\xEF\xBB\xBF// after a byte order mark").classes().empty());

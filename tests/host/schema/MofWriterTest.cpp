@@ -12,7 +12,7 @@
 namespace cimhost::test {
 namespace {
 
-/** The instance of a class whose one property has a text. */
+/** An instance whose only property is a string. */
 Instance instanceWith(const std::string& text) {
     Instance instance;
     instance.path.className = "C";
@@ -34,7 +34,7 @@ TEST(MofWriter, WritesEachKindOfValueAsAConstant) {
     EXPECT_EQ(formatMof(Value{CMPI_string, true, false}), "{}");
 }
 
-TEST(MofWriter, WhatMofHasNoWordForIsNull) {
+TEST(MofWriter, ValuesThatMofCannotExpressAreNull) {
     EXPECT_EQ(formatMof(Value::of(CMPI_real64, std::numeric_limits<double>::infinity())), "NULL");
     EXPECT_EQ(formatMof(Value::of(CMPI_real32, std::nanf(""))), "NULL");
     EXPECT_EQ(formatMof(Value::of(CMPI_ref, std::shared_ptr<const ObjectPath>())), "NULL");
@@ -53,7 +53,7 @@ TEST(MofWriter, AnInstanceHasReplacementCharactersInsteadOfInvalidUtf8) {
     }
 }
 
-TEST(MofWriter, NoLiteralIsLongerThanCompilersHaveRoomForAndTheTextIsReadBack) {
+TEST(MofWriter, ALongStringIsSeveralLiteralsAndIsReadBack) {
     std::string text;
     for (int number = 0; number < 1500; ++number) {
         text += number % 3 == 0 ? "\xE2\x82\xAC" : number % 3 == 1 ? "\x01" : "\"x";
@@ -72,7 +72,7 @@ TEST(MofWriter, NoLiteralIsLongerThanCompilersHaveRoomForAndTheTextIsReadBack) {
     EXPECT_EQ(std::get<std::string>(schema.instances().front().properties.front().value.elements.front()), text);
 }
 
-TEST(MofWriter, AShortTextIsOneLiteral) {
+TEST(MofWriter, AShortStringIsOneLiteral) {
     const std::string text(1000, 'x');
     EXPECT_EQ(formatMof(instanceWith(text)), "instance of C {\n    A = \"" + text + "\";\n};\n");
     EXPECT_EQ(formatMof(instanceWith("")), "instance of C {\n    A = \"\";\n};\n");

@@ -59,7 +59,7 @@ TEST(ObjectPath, MayNameAHostAndBeginWithASlash) {
     EXPECT_EQ(parse("/root/cimv2:Disk").nameSpace, "root/cimv2");
 }
 
-TEST(ObjectPath, KeepsTheLetterCaseThatTheUserTypes) {
+TEST(ObjectPath, KeepsTheUsersLetterCase) {
     const ObjectPath path = parse(R"(dISK.iD="x")");
     EXPECT_EQ(path.className, "dISK");
     EXPECT_EQ(path.keys[0].name, "iD");
@@ -106,7 +106,7 @@ TEST(ObjectPath, SomeKeysAreEnough) {
 }
 
 class PathRoundTrip : public testing::TestWithParam<const char*> {};
-TEST_P(PathRoundTrip, TheWriterGivesWhatTheReaderTook) {
+TEST_P(PathRoundTrip, TheWriterWritesWhatTheReaderRead) {
     EXPECT_EQ(formatObjectPath(parse(GetParam())), GetParam());
 }
 INSTANTIATE_TEST_SUITE_P(
@@ -166,7 +166,7 @@ void PrintTo(const BadPath& bad, std::ostream* out) {
 }
 
 class MalformedPath : public testing::TestWithParam<BadPath> {};
-TEST_P(MalformedPath, IsRefusedWithItsPlace) {
+TEST_P(MalformedPath, IsRejectedWithItsPosition) {
     EXPECT_THAT(refusal(GetParam().text), HasSubstr(GetParam().expected));
 }
 INSTANTIATE_TEST_SUITE_P(
@@ -192,7 +192,7 @@ TEST(ObjectPathError, ANullCharacterIsNoPartOfAKey) {
     EXPECT_NE(refusal(std::string("Disk.ID=\"a\0b\""sv)), "");
 }
 
-TEST(ObjectPathError, DeepNestingAndLongTextsAreRefusedInGoodTime) {
+TEST(ObjectPathError, DeepNestingAndLongPathsAreRejectedQuickly) {
     std::string nested = "Disk.ID=";
     for (int depth = 0; depth < 200; ++depth) {
         nested = "Holds.Held=\"" + nested + "\"";

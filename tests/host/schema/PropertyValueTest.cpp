@@ -32,13 +32,13 @@ std::string refusal(const std::string& property, const std::string& text) {
     }
 }
 
-TEST(PropertyText, AStringIsTakenAsItStands) {
+TEST(PropertyValue, AStringIsUnchanged) {
     for (const char* text : {"", "plain", "null", "5", "\"in quotation marks\"", "back\\slash", "{1}"}) {
         EXPECT_EQ(element<std::string>(parse("Text", text)), text);
     }
 }
 
-TEST(PropertyText, OtherTypesAreConstants) {
+TEST(PropertyValue, OtherTypesAreConstants) {
     EXPECT_TRUE(element<bool>(parse("Flag", "TRUE")));
     EXPECT_FALSE(element<bool>(parse("Flag", "false")));
     EXPECT_EQ(element<std::uint8_t>(parse("U8", "0xff")), 255);
@@ -49,7 +49,7 @@ TEST(PropertyText, OtherTypesAreConstants) {
     EXPECT_EQ(element<DateTime>(parse("Time", "00000000000000.000000+000")).value, "00000000000000.000000+000");
 }
 
-TEST(PropertyText, ACharacterMayStandAloneOrInApostrophes) {
+TEST(PropertyValue, ACharacterMayBeInApostrophes) {
     EXPECT_EQ(element<Char16>(parse("Sign", "x")).code, u'x');
     EXPECT_EQ(element<Char16>(parse("Sign", "'x'")).code, u'x');
     EXPECT_EQ(element<Char16>(parse("Sign", "'")).code, u'\'');
@@ -59,21 +59,21 @@ TEST(PropertyText, ACharacterMayStandAloneOrInApostrophes) {
     EXPECT_NE(refusal("Sign", "\xFF"), "");
 }
 
-TEST(PropertyText, AReferenceIsAPathWithoutQuotationMarks) {
+TEST(PropertyValue, AReferenceIsAPathWithoutQuotationMarks) {
     const auto link = element<std::shared_ptr<const ObjectPath>>(parse("Link", "Disk.ID=\"a\""));
     EXPECT_EQ(link->nameSpace, "root/cimv2");
     EXPECT_EQ(element<std::string>(link->keys[0].value), "a");
     EXPECT_THAT(refusal("Link", "Disk.ID=a"), StartsWith("Link: object path Disk.ID=a: character 9"));
 }
 
-TEST(PropertyText, AnArrayIsAListInBraces) {
+TEST(PropertyValue, AnArrayIsAListInBraces) {
     EXPECT_EQ(formatMof(parse("Numbers", "{1, 0x10,3}")), "{1, 16, 3}");
     EXPECT_EQ(formatMof(parse("Numbers", " { } ")), "{}");
     EXPECT_EQ(formatMof(parse("Texts", R"({"a, b", "c\"d"})")), R"({"a, b", "c\"d"})");
     EXPECT_EQ(formatMof(parse("Links", R"({"Disk.ID=\"x\""})")), R"({"root/cimv2:Disk.ID=\"x\""})");
 }
 
-TEST(PropertyText, AMistakeNamesThePropertyAndTheRemedy) {
+TEST(PropertyValue, AnErrorNamesThePropertyAndTheRemedy) {
     EXPECT_THAT(refusal("U8", "256"), StartsWith("U8: 256 is not a uint8: it must be an integer from 0 to 255"));
     EXPECT_THAT(refusal("U8", ""), HasSubstr("an empty string is not a uint8"));
     EXPECT_THAT(refusal("U8", "null"), HasSubstr("null is not a uint8"));

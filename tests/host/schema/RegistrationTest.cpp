@@ -98,7 +98,7 @@ TEST(RegistrationError, AStanzaMustSayWhichProviderInWhichLibraryServesWhichName
     EXPECT_THAT(refusal("[One]\nprovider: P\nlocation: L\n"), HasSubstr("namespace: root/cimv2"));
 }
 
-TEST(RegistrationFile, IsReadAndItsStanzasKnowWhereTheyStand) {
+TEST(RegistrationFile, IsReadWithThePositionOfEachSection) {
     const TemporaryDirectory directory;
     const auto file = directory.write("one.reg", "#\n[One]\nprovider: P\nlocation: L\nnamespace: n\n");
     const auto stanzas = readRegistrationFile(file);

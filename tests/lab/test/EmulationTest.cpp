@@ -6,7 +6,7 @@
 #include "host/operations/OperationsFixture.h"
 #include "lab/emulation/ManagerEmulation.h"
 
-// The differences of the object managers, one test each: the standard host, SFCB, OpenPegasus.
+// Differences between the standard behaviour, SFCB and OpenPegasus, one test each.
 
 namespace {
 
@@ -17,8 +17,8 @@ using cimhost::Request;
 using cimhost::lab::Manager;
 using testing::HasSubstr;
 using testing::StartsWith;
-using testsupport::text;
 using testsupport::stringOf;
+using testsupport::text;
 
 class EmulationTest : public OperationsTest {
 protected:
@@ -65,7 +65,7 @@ protected:
         return testsupport::named(name, std::move(value));
     }
 
-    /** What the provider says when this class is enumerated. */
+    /** The provider's description when this class is enumerated. */
     std::string told(const char* className) {
         const auto found = manager().perform(Request::enumerateInstances(classPath(className)));
         EXPECT_TRUE(found.ok()) << found.status.message;
@@ -78,7 +78,7 @@ protected:
         return manager().perform(Request::createInstance(path(className, "a"), {}));
     }
 
-    /** What the provider sees of a creation of Echo_Thing.Name="a" with these properties. */
+    /** The provider's description of a creation of Echo_Thing.Name="a" with these properties. */
     std::string seenOfCreation(std::vector<cimhost::NamedValue> properties = {}) {
         EXPECT_TRUE(
             manager().perform(Request::createInstance(path("Echo_Thing", "a"), {{}, std::move(properties)})).ok());
@@ -127,7 +127,7 @@ TEST_F(EmulationTest, ThePrincipalIsEmptyOrLacksCharacters) {
     EXPECT_THAT(seenOfEnumeration(), HasSubstr("CMPIPrincipal=;CMPIRole=(error 12)"));
 }
 
-TEST_F(EmulationTest, APrincipalThatIsGivenStays) {
+TEST_F(EmulationTest, AGivenPrincipalIsUnchanged) {
     as(Manager::sfcb);
     manager().perform(Request::enumerateInstances(classPath("Echo_Thing")).with({with(CMPIPrincipal, text("anna"))}));
     EXPECT_THAT(seen(), HasSubstr("CMPIPrincipal=anna;"));
@@ -135,7 +135,7 @@ TEST_F(EmulationTest, APrincipalThatIsGivenStays) {
 
 // Creation.
 
-TEST_F(EmulationTest, CreationHasWhatTheClientSentOrAllProperties) {
+TEST_F(EmulationTest, ACreationHasTheSentOrAllProperties) {
     as(Manager::standard);
     EXPECT_EQ(seenOfCreation(), "Echo_Thing.Name=a; Name=a;");
     as(Manager::sfcb);
@@ -174,7 +174,7 @@ TEST_F(EmulationTest, CreationThatReturnsAPathGivesIt) {
     }
 }
 
-TEST_F(EmulationTest, CreationThatReturnsAnInstanceIsTakenMisreadOrRefused) {
+TEST_F(EmulationTest, AnInstanceFromACreationIsAcceptedMisreadOrRejected) {
     as(Manager::standard);
     EXPECT_EQ(testsupport::toText(create("Echo_ReturnsInstance").path()),
               "root/cimv2:Echo_ReturnsInstance.Text=\"an instance\"");
@@ -192,14 +192,14 @@ TEST_F(EmulationTest, CreationThatReturnsAnInstanceIsTakenMisreadOrRefused) {
     EXPECT_EQ(seen(), "instance 7");
 }
 
-TEST_F(EmulationTest, APathRepairsARefusedInstance) {
+TEST_F(EmulationTest, APathReplacesARejectedInstance) {
     as(Manager::openPegasus);
     EXPECT_EQ(testsupport::toText(create("Echo_ReturnsBoth").path()), "root/cimv2:Echo_ReturnsBoth.Name=\"made\"");
     as(Manager::sfcb);
     EXPECT_EQ(create("Echo_ReturnsBoth").path().className, "root/cimv2") << "what comes first counts";
 }
 
-TEST_F(EmulationTest, CreationThatReturnsNothingEndsAProcessOrBreaksTheResponse) {
+TEST_F(EmulationTest, ACreationWithoutResultCrashesOrBreaksTheResponse) {
     as(Manager::standard);
     EXPECT_THAT(create("Echo_ReturnsNothing").status.message, HasSubstr("neither path nor instance"));
     as(Manager::sfcb);
@@ -222,7 +222,7 @@ TEST_F(EmulationTest, APathThatIsReleasedAfterItWasReturnedMayEndTheProcess) {
 
 // Modification, get, property lists.
 
-TEST_F(EmulationTest, ModificationHasWhatTheClientSentOrAllProperties) {
+TEST_F(EmulationTest, AModificationHasTheSentOrAllProperties) {
     const std::vector<cimhost::NamedValue> changes{with("Size", testsupport::uint32(5))};
     as(Manager::standard);
     EXPECT_EQ(seenOfModification(changes, {}), "Echo_Thing.Name=a; Size=5; null");
@@ -265,7 +265,7 @@ TEST_F(EmulationTest, GetWithoutAnInstanceIsNotFoundAndMayNotBeDone) {
     }
 }
 
-TEST_F(EmulationTest, TextsLoseBlanksAndOtherBytesAtTheirEnds) {
+TEST_F(EmulationTest, StringsLoseBlanksAndOtherBytesAtTheirEnds) {
     const std::vector<cimhost::NamedValue> given{with("Text", text(" \xC3\xA9 a b\xC3\xA9 "))};
     as(Manager::standard);
     EXPECT_THAT(seenOfCreation(given), HasSubstr("Text= \xC3\xA9 a b\xC3\xA9 ;"));
@@ -286,7 +286,7 @@ TEST_F(EmulationTest, NamesKeepTheClientsLetterCase) {
 
 // Associations.
 
-TEST_F(EmulationTest, AProviderIsToldTheAssociationClassThatItIsAskedForOrThatTheClientSent) {
+TEST_F(EmulationTest, AProviderReceivesItsAssociationClassOrThatOfTheClient) {
     const auto found = [this] { return manager().perform(Request::associators(path("Echo_Thing", "a"), {})); };
     as(Manager::standard);
     ASSERT_EQ(found().instances.size(), 2U);
@@ -325,7 +325,7 @@ TEST_F(EmulationTest, ReferencesThatAreNotSupportedMayBeNone) {
 
 // Threads, exceptions, factories.
 
-TEST_F(EmulationTest, ARequestHasTheCallersThreadOrOneOfItsOwn) {
+TEST_F(EmulationTest, ARequestRunsOnTheCallersThreadOrASeparateOne) {
     std::ostringstream mine;
     mine << std::this_thread::get_id();
     as(Manager::standard);
@@ -353,7 +353,7 @@ TEST_F(EmulationTest, AFactoryMayMakeUpCallsThatStartProviders) {
     }
 }
 
-TEST_F(EmulationTest, AnExceptionIsAFailureEndsTheProcessOrIsUnknown) {
+TEST_F(EmulationTest, AnExceptionIsAFailureOrACrashOrUnknown) {
     const auto thrown = [this] {
         return manager().perform(Request::enumerateInstances(classPath("Echo_Throwing"))).status;
     };

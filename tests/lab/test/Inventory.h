@@ -9,7 +9,7 @@
 #include "schema/Registration.h"
 #include "support/Values.h"
 
-/** The inventory's classes. */
+/** The classes of the inventory. */
 inline const cimhost::Schema& inventorySchema() {
     static const cimhost::Schema schema = [] {
         cimhost::Schema made;
@@ -27,7 +27,7 @@ inline cimhost::lab::LoadClass inventoryClass(const std::string& className = "In
     return cimhost::lab::loadClass(inventorySchema(), inventoryPath(className));
 }
 
-/** What a manager that serves the inventory works with. */
+/** The options of a manager with the inventory. */
 inline cimhost::ObjectManagerOptions inventoryOptions(cimhost::lab::Manager manager) {
     cimhost::ObjectManagerOptions options;
     options.libraries.searchPath = {INVENTORY_PROVIDERS};

@@ -34,7 +34,7 @@ TEST(LoadCommand, ReportsFiguresAndSucceedsWhenNoAnswerIsWrong) {
                       HasSubstr("\nall "), HasSubstr("no answer was wrong\n")));
 }
 
-TEST(LoadCommand, TellsWrongAnswersInWordsAndFails) {
+TEST(LoadCommand, DescribesWrongAnswersAndFails) {
     const Ended ended = runInventory({"load", "Inventory_Liar", "--requests", "400", "--show", "1"});
     EXPECT_EQ(ended.status, 1);
     EXPECT_THAT(ended.error, testing::MatchesRegex("cimhost-lab: [0-9]+ answers were wrong\n"));
@@ -99,7 +99,7 @@ TEST(LoadCommand, AFailureBeforeTheLoadIsAnError) {
     EXPECT_THAT(ended.error, HasSubstr("CMPI_RC_ERR_INVALID_NAMESPACE"));
 }
 
-TEST(LoadCommand, SaysWhatIsWrongWithTheCommandLine) {
+TEST(LoadCommand, ReportsErrorsOfTheCommandLine) {
     const std::pair<std::vector<std::string>, const char*> lines[] = {
         {{"load"}, "CLASS is required"},
         {{"load", "Inventory_Missing"}, "not in the schema"},
@@ -122,7 +122,7 @@ TEST(LoadCommand, SaysWhatIsWrongWithTheCommandLine) {
     }
 }
 
-TEST(LoadCommand, HelpSaysWhatALoadDoesToProvidersForOneRequestAtATime) {
+TEST(LoadCommand, HelpExplainsProvidersWithoutConcurrency) {
     const std::string help = runBare({"load", "--help"}).output;
     EXPECT_THAT(help, AllOf(HasSubstr("--clients"), HasSubstr("does not support this returns wrong responses"),
                             HasSubstr("exit status"), HasSubstr("--assoc-class")));

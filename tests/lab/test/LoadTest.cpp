@@ -56,7 +56,7 @@ protected:
     LoadAsManager() : LoadTest(GetParam()) {}
 };
 
-TEST_P(LoadAsManager, AProviderThatIsRightHasNoWrongAnswer) {
+TEST_P(LoadAsManager, ARightProviderHasNoWrongAnswer) {
     plan.source = inventoryClass().instancePath("any");
     plan.associationClass = "Inventory_Holds";
     plan.mix = Mix("create=4,modify=5,delete=3,enumerate=1,get=7,associate=2");
@@ -84,7 +84,7 @@ void PrintTo(const WrongClass& wrong, std::ostream* out) {
 
 class LoadOnWrongClass : public LoadTest, public testing::WithParamInterface<WrongClass> {};
 
-TEST_P(LoadOnWrongClass, TellsWhatIsWrong) {
+TEST_P(LoadOnWrongClass, ReportsTheMismatch) {
     const Report report = run({GetParam().className});
     EXPECT_THAT(report.kinds, testing::Contains(Key(GetParam().kind))) << firstOf(report);
     EXPECT_FALSE(report.first.empty());
@@ -101,7 +101,7 @@ INSTANTIATE_TEST_SUITE_P(
                     WrongClass{"Inventory_Silent", "status"}),
     [](const auto& each) { return std::string(each.param.className).substr(6); });
 
-TEST_F(LoadTest, OnlyOneThingIsWrongWhereOnlyOneThingIs) {
+TEST_F(LoadTest, ASingleDefectIsASingleMismatch) {
     for (const auto& [className, kind] :
          {std::pair("Inventory_Liar", "value"), std::pair("Inventory_Forgetful", "missing"),
           std::pair("Inventory_Misnaming", "path"), std::pair("Inventory_Polite", "status")}) {
@@ -110,7 +110,7 @@ TEST_F(LoadTest, OnlyOneThingIsWrongWhereOnlyOneThingIs) {
     }
 }
 
-TEST_F(LoadTest, WithoutProbesOnlyWhatIsThereIsAskedFor) {
+TEST_F(LoadTest, WithoutProbesOnlyExistingInstancesAreRequested) {
     EXPECT_THAT(run({"Inventory_Polite"}).kinds, testing::Contains(Key("status"))) << "success for what is not there";
     plan.probes = false;
     EXPECT_THAT(run({"Inventory_Polite"}).kinds, IsEmpty());
@@ -136,7 +136,7 @@ TEST_F(LoadTest, TheSameSeedIsTheSameLoad) {
     EXPECT_NE(firstOf(run({"Inventory_Liar"})), firstOf(first));
 }
 
-TEST_F(LoadTest, WhatWasThereStaysAndWhatIsKeptIsNotMistaken) {
+TEST_F(LoadTest, InitialInstancesRemainAndAreNotMistaken) {
     manager.perform(Request::createInstance(inventoryClass().instancePath("mine"), {}));
     plan.keeps = true;
     EXPECT_THAT(run().kinds, IsEmpty());
@@ -178,7 +178,7 @@ protected:
     LoadAsSfcb() : LoadTest(Manager::sfcb) {}
 };
 
-TEST_F(LoadAsSfcb, WhatWouldEndTheProcessIsTold) {
+TEST_F(LoadAsSfcb, ACrashIsReported) {
     for (const char* className : {"Inventory_Throwing", "Inventory_Silent"}) {
         EXPECT_THAT(run({className}).kinds, testing::Contains(Key("died"))) << className;
     }

@@ -24,7 +24,7 @@ std::string errorOf(Body body) {
     }
 }
 
-TEST(Mix, DoesWhatIsNamedAsOftenAsItSays) {
+TEST(Mix, ChoosesKindsByWeight) {
     const Mix mix("create=1,get=3");
     Random random(1, 1);
     int gets = 0;
@@ -46,7 +46,7 @@ TEST(Mix, UsuallyDoesEverythingButAssociations) {
     EXPECT_EQ(mix.weight(OperationKind::associate), 0U);
 }
 
-TEST(Mix, RefusesWhatItCannotRead) {
+TEST(Mix, RejectsInvalidLists) {
     EXPECT_THAT(errorOf([] { Mix("create=1,fly=2"); }), HasSubstr("fly is not one of create, modify"));
     EXPECT_THAT(errorOf([] { Mix("create"); }), HasSubstr("'create' is not NAME=WEIGHT"));
     EXPECT_THAT(errorOf([] { Mix("create=x"); }), HasSubstr("'x' is not a weight"));
@@ -77,7 +77,7 @@ TEST(LoadClass, FindsIdentifiersInPathsAndInstances) {
     EXPECT_EQ(thing.idIn({testsupport::named("Name", testsupport::nullOf(CMPI_string))}), std::nullopt);
 }
 
-TEST(LoadClass, RefusesClassesThatClientsCannotNameInstancesOf) {
+TEST(LoadClass, RejectsClassesWithoutASingleStringKey) {
     EXPECT_THAT(errorOf([] { inventoryClass("Inventory_Numbered"); }), HasSubstr("other keys than one string"));
     EXPECT_THAT(errorOf([] { inventoryClass("Inventory_Pair"); }), HasSubstr("other keys than one string"));
     EXPECT_THAT(errorOf([] { inventoryClass("Inventory_Missing"); }), HasSubstr("not in the schema"));

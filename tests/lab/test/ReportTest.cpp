@@ -55,7 +55,7 @@ TEST(Statistics, AddsUp) {
     EXPECT_THAT(report.kinds, ElementsAre(Pair("deleted", 1), Pair("status", 1), Pair("value", 1)));
 }
 
-TEST(Statistics, TellsTheFirstInWords) {
+TEST(Statistics, DescribesTheFirst) {
     Statistics all(3);
     Statistics one(3);
     for (std::size_t number = 1; number <= 5; ++number) {

@@ -26,7 +26,7 @@ Property property(CMPIType type, bool isArray = false) {
 
 class MadeValue : public testing::TestWithParam<CMPIType> {};
 
-TEST_P(MadeValue, HasTheTypeAndComesAgainFromTheSameSeed) {
+TEST_P(MadeValue, HasTheTypeAndIsTheSameForTheSameSeed) {
     const Property of = property(GetParam());
     ASSERT_TRUE(canMakeValue(of));
     Random random(7, 3);
@@ -45,7 +45,7 @@ INSTANTIATE_TEST_SUITE_P(Types, MadeValue,
                                          CMPI_real32, CMPI_real64),
                          [](const auto& each) { return std::string(cimhost::typeName(each.param)); });
 
-TEST(MadeValues, ThereAreNoneOfOtherTypes) {
+TEST(MadeValues, DoNotExistForOtherTypes) {
     EXPECT_FALSE(canMakeValue(property(CMPI_ref)));
     EXPECT_FALSE(canMakeValue(property(CMPI_instance)));
     EXPECT_FALSE(canMakeValue(property(CMPI_string, true)));
