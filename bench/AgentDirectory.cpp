@@ -14,14 +14,14 @@ namespace fs = std::filesystem;
 AgentDirectory::AgentDirectory() {
     std::string pattern = (fs::temp_directory_path() / "bench-XXXXXX").string();
     if (mkdtemp(pattern.data()) == nullptr) {
-        throw std::runtime_error("cannot make a temporary directory");
+        throw std::runtime_error("cannot create a temporary directory");
     }
     root = pattern;
     fs::create_directory(data());
-    fs::create_directory(floorData());
+    fs::create_directory(baselineData());
     const fs::path configuration = root / "agent.toml";
     writeConfiguration(configuration);
-    std::ofstream(data() / "asset.dat") << assetFileText();
+    std::ofstream(data() / "asset.dat") << assetFileContent();
     setenv("OSTREL_CONFIG", configuration.c_str(), 1);
 }
 
@@ -31,13 +31,13 @@ AgentDirectory::~AgentDirectory() {
 }
 
 void AgentDirectory::removeRecords() const {
-    for (const fs::path& folder : {data(), floorData()}) {
-        fs::remove(folder / LeaseRow::fileName);
-        fs::remove(folder / WarrantyRow::fileName);
+    for (const fs::path& directory : {data(), baselineData()}) {
+        fs::remove(directory / LeaseRow::fileName);
+        fs::remove(directory / WarrantyRow::fileName);
     }
 }
 
-/** A path goes to a stream in quotes, as TOML wants it. */
+/** A stream writes paths in quotes, as TOML requires. */
 void AgentDirectory::writeConfiguration(const fs::path& file) const {
     std::ofstream stream(file);
     stream << "[directories]\ndata = " << data() << "\ninstall = " << root << "\n[product]\nname = \"" << names::agent

@@ -5,8 +5,8 @@
 namespace bench {
 
 /**
- * A temporary directory with an agent's configuration, in which the log goes nowhere, and its data. It is there, and
- * announced in the environment, before the agent's libraries are loaded; it is removed in the end.
+ * A temporary directory with an agent's configuration, without a log, and its data. Construct it before the agent's
+ * libraries are loaded, since it sets their environment variable.
  */
 class AgentDirectory {
 public:
@@ -17,10 +17,10 @@ public:
 
     std::filesystem::path data() const { return root / "data"; }
 
-    /** Where the floor writes what the provider writes to its data directory. */
-    std::filesystem::path floorData() const { return root / "floor"; }
+    /** The data directory of the baseline. */
+    std::filesystem::path baselineData() const { return root / "baseline"; }
 
-    /** Removes the record files; the asset file stays. */
+    /** Removes the record files, not the asset file. */
     void removeRecords() const;
 
 private:

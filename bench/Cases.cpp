@@ -9,81 +9,93 @@ const std::vector<std::size_t> writeSizes{10, 100, 1000, 10000};
 
 namespace {
 
-/** What the gate adds is told by the smaller tables. */
+using cimhost::ObjectPath;
+using cimhost::Request;
+
+/** Larger tables are not measured behind the gate: its share does not depend on the size. */
 constexpr std::size_t largestGated = 1000;
 
-/** A case whose floor has a table of that many rows. What the provider is loaded with is left open. */
+/** A case whose baseline has a table of this many rows. The caller sets the provider. */
 template <class Row>
-Case floorCase(std::string operation, std::size_t size, Request request) {
+Case baselineCase(std::string operation, std::size_t size, ExpectedRequest request) {
     Case one;
     one.operation = std::move(operation);
     one.className = Row::className;
     one.size = size;
     one.request = std::move(request);
-    one.floor = [size](const Workbench&, const CMPIBroker* broker) {
-        return makeFloor(broker, makeRows<Row>(size), {});
+    one.baseline = [size](const Environment&, const CMPIBroker* broker) {
+        return makeBaseline(broker, makeRows<Row>(size), {});
     };
     return one;
 }
 
-/** A case whose provider and floor have a table of that many rows. */
+/** A case whose provider and baseline have a table of this many rows. */
 template <class Row>
-Case readCase(std::string operation, std::size_t size, Request request) {
-    Case one = floorCase<Row>(std::move(operation), size, std::move(request));
-    one.provider = [size](Workbench& bench) { return bench.loaded<Row>(size); };
+Case readCase(std::string operation, std::size_t size, ExpectedRequest request) {
+    Case one = baselineCase<Row>(std::move(operation), size, std::move(request));
+    one.provider = [size](Environment& environment) { return environment.loaded<Row>(size); };
     if (size <= largestGated) {
-        one.twice = [size](Workbench& bench) { return bench.loadedTwice<Row>(size); };
+        one.twice = [size](Environment& environment) { return environment.loadedTwice<Row>(size); };
     }
     return one;
 }
 
-/** A case whose request changes the table: each request finds the table and its file as they were made. */
+/** A case whose request changes the table. Each request finds the initial table and file. */
 template <class Row>
-Case writeCase(std::string operation, std::size_t size, Request request) {
-    Case one = floorCase<Row>(std::move(operation), size, std::move(request));
+Case writeCase(std::string operation, std::size_t size, ExpectedRequest request) {
+    Case one = baselineCase<Row>(std::move(operation), size, std::move(request));
     one.changedFile = Row::fileName;
-    one.provider = [size](Workbench& bench) { return bench.load(makeRows<Row>(size)); };
-    one.floor = [size](const Workbench& bench, const CMPIBroker* broker) {
-        return makeFloor(broker, makeRows<Row>(size), bench.agent().floorData() / Row::fileName);
+    one.provider = [size](Environment& environment) { return environment.load(makeRows<Row>(size)); };
+    one.baseline = [size](const Environment& environment, const CMPIBroker* broker) {
+        return makeBaseline(broker, makeRows<Row>(size), environment.agent().baselineData() / Row::fileName);
     };
     return one;
 }
 
 template <class Row>
-cimhost::ObjectPath recordPath(const std::string& instanceId) {
-    cimhost::ObjectPath path = classPath(Row::className);
-    path.keys.push_back(textValue("InstanceID", instanceId));
-    return path;
+ObjectPath recordOf(std::size_t index, std::size_t size) {
+    return recordPath(Row::className, instanceIdOf(index, size));
+}
+
+template <class Row>
+void addEnumerations(std::vector<Case>& cases, std::size_t size) {
+    const ObjectPath path = classPath(Row::className);
+    cases.push_back(readCase<Row>("EnumInstances", size, {Request::enumerateInstances(path), size}));
+    cases.push_back(readCase<Row>("EnumInstanceNames", size, {Request::enumerateInstanceNames(path), size}));
+}
+
+template <class Row>
+void addGet(std::vector<Case>& cases, const char* operation, std::size_t index, std::size_t size) {
+    cases.push_back(readCase<Row>(operation, size, {Request::getInstance(recordOf<Row>(index, size)), 1}));
+}
+
+template <class Row>
+void addModification(std::vector<Case>& cases, std::size_t size) {
+    const auto value = namedString(Row::modified.name, "Another Party Ltd");
+    cases.push_back(writeCase<Row>("ModifyInstance", size, {modification(recordOf<Row>(size / 2, size), value)}));
 }
 
 template <class Row>
 void addReads(std::vector<Case>& cases, std::size_t size) {
-    const auto got = [&](std::size_t index) { return getInstance(recordPath<Row>(instanceIdOf(index, size))); };
-    cases.push_back(readCase<Row>("EnumInstances", size, enumInstances(Row::className, size)));
-    cases.push_back(readCase<Row>("EnumInstanceNames", size, enumInstanceNames(Row::className, size)));
-    cases.push_back(readCase<Row>("GetInstance.first", size, got(0)));
-    cases.push_back(readCase<Row>("GetInstance.middle", size, got(size / 2)));
-    cases.push_back(readCase<Row>("GetInstance.last", size, got(size - 1)));
+    addEnumerations<Row>(cases, size);
+    addGet<Row>(cases, "GetInstance.first", 0, size);
+    addGet<Row>(cases, "GetInstance.middle", size / 2, size);
+    addGet<Row>(cases, "GetInstance.last", size - 1, size);
 }
 
 template <class Row>
 void addWrites(std::vector<Case>& cases, std::size_t size) {
-    const cimhost::ObjectPath middle = recordPath<Row>(instanceIdOf(size / 2, size));
-    cases.push_back(writeCase<Row>("CreateInstance", size, createInstance(recordPath<Row>("a new record"))));
-    cases.push_back(writeCase<Row>("ModifyInstance", size,
-                                   modifyInstance(middle, textValue(Row::modified.name, "Another Party Ltd"))));
-    cases.push_back(writeCase<Row>("DeleteInstance", size, deleteInstance(middle)));
+    const ObjectPath added = recordPath(Row::className, "a new record");
+    cases.push_back(writeCase<Row>("CreateInstance", size, {creation(added), 1}));
+    addModification<Row>(cases, size);
+    cases.push_back(writeCase<Row>("DeleteInstance", size, {Request::deleteInstance(recordOf<Row>(size / 2, size))}));
 }
 
-/** What a table costs that no machine has; of leases only, whose records are the longer ones. */
+/** A table larger than in practice; only of leases, whose records are the longer ones. */
 void addLargest(std::vector<Case>& cases) {
-    using Row = LeaseRow;
-    const cimhost::ObjectPath middle = recordPath<Row>(instanceIdOf(largestSize / 2, largestSize));
-    cases.push_back(readCase<Row>("EnumInstances", largestSize, enumInstances(Row::className, largestSize)));
-    cases.push_back(readCase<Row>("EnumInstanceNames", largestSize, enumInstanceNames(Row::className, largestSize)));
-    cases.push_back(readCase<Row>("GetInstance.middle", largestSize, getInstance(middle)));
-    cases.push_back(writeCase<Row>("ModifyInstance", largestSize,
-                                   modifyInstance(middle, textValue(Row::modified.name, "Another Party Ltd"))));
+    addEnumerations<LeaseRow>(cases, largestSize);
+    addGet<LeaseRow>(cases, "GetInstance.middle", largestSize / 2, largestSize);
+    addModification<LeaseRow>(cases, largestSize);
 }
 
 template <class Row>
@@ -96,31 +108,27 @@ void addRecords(std::vector<Case>& cases) {
     }
 }
 
-/** The cases of a product class, which is served without records. */
+/** The cases of a product class, which has no records. */
 template <class Row>
 void addProduct(std::vector<Case>& cases) {
-    cimhost::ObjectPath path = classPath(Row::className);
-    for (const Row& row : makeRows<Row>(1)) {
-        for (const auto& key : Row::keys) {
-            path.keys.push_back(textValue(key.name, row.*key.member));
-        }
-    }
-    for (auto& [operation, request] :
-         {std::pair{"EnumInstances", enumInstances(Row::className, 1)}, std::pair{"GetInstance", getInstance(path)}}) {
-        Case one = floorCase<Row>(operation, 1, request);
-        one.provider = [](Workbench& bench) { return bench.loaded<LeaseRow>(10); };
+    const ObjectPath path = productPath(makeRows<Row>(1).front());
+    for (const auto& [operation, request] :
+         {std::pair{"EnumInstances", Request::enumerateInstances(classPath(Row::className))},
+          std::pair{"GetInstance", Request::getInstance(path)}}) {
+        Case one = baselineCase<Row>(operation, 1, {request, 1});
+        one.provider = [](Environment& environment) { return environment.loaded<LeaseRow>(10); };
         cases.push_back(std::move(one));
     }
 }
 
-Case associationCase(std::string operation, std::size_t computers, Request request) {
+Case associationCase(std::string operation, std::size_t computers, ExpectedRequest request) {
     constexpr std::size_t size = 1000;
     Case one = readCase<LeaseRow>(std::move(operation), size, std::move(request));
-    one.className = "VELKO_LeaseSetting";
-    one.twice = nullptr;  // its answers are others
+    one.className = names::leaseSettingClass;
+    one.twice = nullptr;  // the gate returns other results
     one.computers = computers;
-    one.floor = [](const Workbench&, const CMPIBroker* broker) {
-        return makeAssociationFloor(broker, makeRows<LeaseRow>(size));
+    one.baseline = [](const Environment&, const CMPIBroker* broker) {
+        return makeAssociationBaseline(broker, makeRows<LeaseRow>(size));
     };
     return one;
 }
@@ -143,18 +151,23 @@ std::vector<Case> productCases() {
 }
 
 std::vector<Case> associationCases() {
-    cimhost::ObjectPath computer = classPath("VELKO_ComputerSystem");
-    computer.keys.push_back(textValue("Name", names::computer));
-    const cimhost::ObjectPath lease = recordPath<LeaseRow>(names::computerNode);
-    // From a lease, the last computer is left out: one computer gives no answer, two give one.
+    const ObjectPath computer = computerPath(names::computer);
+    const ObjectPath lease = recordPath(LeaseRow::className, names::computerNode);
+    const cimhost::AssociationFilter filter = leaseSettings();
+    const Request namesOfComputer = Request::associatorNames(computer, filter);
+    const Request ofComputer = Request::associators(computer, filter);
+    const Request namesOfLease = Request::associatorNames(lease, filter);
+    const Request ofLease = Request::associators(lease, filter);
+    // From a lease, the provider omits the last computer: of one computer it returns none, of two the first.
     return {
-        associationCase("AssociatorNames.fromComputer", 1, associatorNames(computer, 1)),
-        associationCase("Associators.fromComputer", 1, associators(computer, 1)),
-        associationCase("AssociatorNames.fromLease", 1, associatorNames(lease, 0)),
-        associationCase("Associators.fromLease", 1, associators(lease, 0)),
-        associationCase("AssociatorNames.fromLeaseOfTwo", 2, associatorNames(lease, 1)),
-        associationCase("Associators.fromLeaseOfTwo", 2, associators(lease, 1)),
-        associationCase("EnumInstanceNames", 1, enumInstanceNames("VELKO_LeaseSetting", 1000)),
+        associationCase("AssociatorNames.fromComputer", 1, {namesOfComputer, 1}),
+        associationCase("Associators.fromComputer", 1, {ofComputer, 1}),
+        associationCase("AssociatorNames.fromLease", 1, {namesOfLease, 0}),
+        associationCase("Associators.fromLease", 1, {ofLease, 0}),
+        associationCase("AssociatorNames.fromLeaseOfTwo", 2, {namesOfLease, 1}),
+        associationCase("Associators.fromLeaseOfTwo", 2, {ofLease, 1}),
+        associationCase("EnumInstanceNames", 1,
+                        {Request::enumerateInstanceNames(classPath(names::leaseSettingClass)), 1000}),
     };
 }
 

@@ -1,9 +1,5 @@
 #pragma once
 
-#include "Floor.h"
-#include "Requests.h"
-#include "Workbench.h"
-
 #include <cstddef>
 #include <filesystem>
 #include <functional>
@@ -12,31 +8,36 @@
 #include <utility>
 #include <vector>
 
+#include "Baseline.h"
+#include "Environment.h"
+#include "Requests.h"
+
 namespace bench {
 
 /**
- * One thing that is measured of the provider and of the floor alike. Registered as three benchmarks, with names of the
- * form Operation[.detail]/Class/provider/size, .../floor/size and .../both/size, which asks the two in turn.
+ * A request that is measured with the provider and the baseline. It is registered as three benchmarks, with names of
+ * the form Operation[.detail]/Class/provider/size, .../baseline/size and .../both/size, which alternates between the
+ * two.
  */
 struct Case {
     std::string operation;
     std::string className;
     std::size_t size = 1;  ///< records in the table
-    Request request;
-    std::function<Interfaces(Workbench&)> provider;  ///< gives the provider, with the table that the request needs
-    std::function<std::unique_ptr<Floor>(const Workbench&, const CMPIBroker*)> floor;
-    std::string changedFile{};  ///< of a request that changes records: name of the file, else empty
-    std::size_t computers = 1;  ///< that the object manager knows of
+    ExpectedRequest request;
+    std::function<Interfaces(Environment&)> provider;  ///< loads the provider with the table that the request needs
+    std::function<std::unique_ptr<Baseline>(const Environment&, const CMPIBroker*)> baseline;
+    std::string changedFile{};  ///< name of the file that the request changes; empty: none
+    std::size_t computers = 1;  ///< computers that the object manager has
 
-    /** Gives the provider alone and behind the gate, where the two are measured side by side: .../gate/size. */
-    std::function<std::pair<Interfaces, Interfaces>(Workbench&)> twice{};
+    /** Loads the provider alone and behind the gate, for a benchmark that alternates between them: .../gate/size. */
+    std::function<std::pair<Interfaces, Interfaces>(Environment&)> twice{};
 };
 
-/** The sizes of tables whose records are read, and of those that are written. */
+/** The sizes of the tables for reads, and for writes. */
 extern const std::vector<std::size_t> readSizes;
 extern const std::vector<std::size_t> writeSizes;
 
-/** The size of a table that shows whether all stays linear: only of leases, and of few requests. */
+/** The size of a table that shows whether times are linear: only leases, and few requests. */
 constexpr std::size_t largestSize = 1000000;
 
 /** @name The cases */
@@ -47,12 +48,12 @@ std::vector<Case> associationCases();
 ///@}
 
 /**
- * Registers a case's benchmarks. Each checks every answer that it measures, and those of the provider are held
- * against the floor's, as a whole; a wrong one ends the benchmark with an error and sets failed.
+ * Registers the benchmarks of a case. They check each response, and compare the results of the provider with those of
+ * the baseline. A wrong response ends the benchmark with an error and sets failed.
  */
-void registerCase(const Case& one, Workbench& workbench, bool& failed);
+void registerCase(const Case& one, Environment& environment, bool& failed);
 
-/** Registers the loading of the library: from dlopen to the end of dlclose, against reading the file. */
-void registerLoading(Workbench& workbench, bool& failed);
+/** Registers the loading of the library, from dlopen to the end of dlclose, and the reading of the file. */
+void registerLoading(Environment& environment, bool& failed);
 
 }  // namespace bench

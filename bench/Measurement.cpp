@@ -1,5 +1,5 @@
 #include "Cases.h"
-#include "Holdings.h"
+#include "ProcessResources.h"
 
 #include <benchmark/benchmark.h>
 #include <malloc.h>
@@ -19,7 +19,7 @@ namespace bench {
 
 namespace {
 
-std::string fileText(const std::filesystem::path& file) {
+std::string contentOf(const std::filesystem::path& file) {
     std::ifstream stream(file, std::ios::binary);
     if (!stream) {
         throw std::runtime_error("there is no " + file.string());
@@ -27,66 +27,68 @@ std::string fileText(const std::filesystem::path& file) {
     return {std::istreambuf_iterator<char>(stream), {}};
 }
 
-/** @throws std::runtime_error unless a change by the provider left what the floor's left */
-void requireSameFile(const Workbench& bench, const Case& one) {
-    if (!one.changedFile.empty() &&
-        fileText(bench.agent().data() / one.changedFile) != fileText(bench.agent().floorData() / one.changedFile)) {
-        throw std::runtime_error("the record file is not what it should be after the change");
+/** @throws std::runtime_error unless the changes of provider and baseline resulted in the same file */
+void requireSameFile(const Environment& environment, const Case& one) {
+    if (!one.changedFile.empty() && contentOf(environment.agent().data() / one.changedFile) !=
+                                        contentOf(environment.agent().baselineData() / one.changedFile)) {
+        throw std::runtime_error("the record file differs from the baseline's");
     }
 }
 
-/** Performs a request once an iteration. @param interfaces gives what answers it @return the last outcome */
-template <class GiveInterfaces>
-Outcome measure(benchmark::State& state, Workbench& bench, const Request& request, GiveInterfaces interfaces) {
-    Outcome outcome;
+/** Performs a request once per iteration. @param load returns the interfaces  @return the last response */
+template <class Load>
+TimedResponse measure(benchmark::State& state, Environment& environment, const ExpectedRequest& request, Load load) {
+    TimedResponse response;
     for (auto _ : state) {
-        outcome = {};
-        outcome = perform(bench.broker(), request, interfaces());
-        state.SetIterationTime(outcome.seconds);
-        requireAnswered(request, outcome);
+        response = {};
+        response = perform(environment.broker(), request.request, load());
+        state.SetIterationTime(response.seconds);
+        requireExpected(request, response);
     }
-    return outcome;
+    return response;
 }
 
-void measureFloor(benchmark::State& state, Workbench& bench, const Case& one) {
-    std::unique_ptr<Floor> floor;
-    measure(state, bench, one.request, [&] {
-        if (floor == nullptr || !one.changedFile.empty()) {
-            floor = one.floor(bench, bench.broker().handle());
+void measureBaseline(benchmark::State& state, Environment& environment, const Case& one) {
+    std::unique_ptr<Baseline> baseline;
+    measure(state, environment, one.request, [&] {
+        if (baseline == nullptr || !one.changedFile.empty()) {
+            baseline = one.baseline(environment, environment.broker().handle());
         }
-        return floor->interfaces();
+        return baseline->interfaces();
     });
 }
 
-void measureProvider(benchmark::State& state, Workbench& bench, const Case& one) {
-    const auto askFloor = [&] {
-        return perform(bench.broker(), one.request, one.floor(bench, bench.broker().handle())->interfaces());
+void measureProvider(benchmark::State& state, Environment& environment, const Case& one) {
+    const auto performBaseline = [&] {
+        return perform(environment.broker(), one.request.request,
+                       one.baseline(environment, environment.broker().handle())->interfaces());
     };
-    askFloor();  // the memory for the answer is now in the process, and no side pays for getting it
-    const Outcome outcome = measure(state, bench, one.request, [&] { return one.provider(bench); });
-    requireSame(outcome.events, askFloor().events);
-    requireSameFile(bench, one);
+    performBaseline();  // allocates the memory of the response, so that its allocation is not measured
+    const TimedResponse response = measure(state, environment, one.request, [&] { return one.provider(environment); });
+    requireSame(response.events, performBaseline().events);
+    requireSameFile(environment, one);
 }
 
-/** The time of a request. @throws std::runtime_error unless the answer is the expected one */
-double secondsOf(Workbench& bench, const Request& request, const Interfaces& interfaces, const Outcome& expected) {
-    const Outcome outcome = perform(bench.broker(), request, interfaces);
-    requireAnswered(request, outcome);
-    requireSame(outcome.events, expected.events);
-    return outcome.seconds;
+/** The time of a request. @throws std::runtime_error if the response is not the expected one */
+double secondsOf(Environment& environment, const ExpectedRequest& request, const Interfaces& interfaces,
+                 const TimedResponse& expected) {
+    const TimedResponse response = perform(environment.broker(), request.request, interfaces);
+    requireExpected(request, response);
+    requireSame(response.events, expected.events);
+    return response.seconds;
 }
 
-/** The middle of some times: neither what disturbs some of them nor a clock that goes in leaps counts. */
-double middle(std::vector<double> seconds) {
+/** The median, which outliers and a coarse clock do not change. */
+double median(std::vector<double> seconds) {
     const auto half = seconds.begin() + static_cast<std::ptrdiff_t>(seconds.size() / 2);
     std::nth_element(seconds.begin(), half, seconds.end());
     if (*half <= 0) {
-        throw std::runtime_error("the clock stands still");
+        throw std::runtime_error("the clock does not advance");
     }
     return *half;
 }
 
-/** Times two sides in turn, so that what else the machine does falls on both. The middle time of each is told. */
+/** Times two sides alternately, so that other work of the machine affects both. Reports the median of each. */
 void measureInTurn(benchmark::State& state, int turns, const char* firstName, const std::function<double()>& first,
                    const char* secondName, const std::function<double()>& second) {
     std::vector<double> firstTimes;
@@ -100,52 +102,52 @@ void measureInTurn(benchmark::State& state, int turns, const char* firstName, co
         }
         state.SetIterationTime(seconds);
     }
-    state.counters[firstName] = middle(std::move(firstTimes));
-    state.counters[secondName] = middle(std::move(secondTimes));
+    state.counters[firstName] = median(std::move(firstTimes));
+    state.counters[secondName] = median(std::move(secondTimes));
 }
 
-/** How often each side has its turn in an iteration, of which there may be one only. */
+/** The number of requests per side and iteration. There may be only one iteration. */
 int turnsFor(const Case& one) {
     return one.size < largestSize ? 10 : 3;
 }
 
-void measureBoth(benchmark::State& state, Workbench& bench, const Case& one) {
-    std::unique_ptr<Floor> floor;
-    const auto askFloor = [&] {
-        if (floor == nullptr || !one.changedFile.empty()) {
-            floor = one.floor(bench, bench.broker().handle());
+void measureBoth(benchmark::State& state, Environment& environment, const Case& one) {
+    std::unique_ptr<Baseline> baseline;
+    const auto performBaseline = [&] {
+        if (baseline == nullptr || !one.changedFile.empty()) {
+            baseline = one.baseline(environment, environment.broker().handle());
         }
-        return perform(bench.broker(), one.request, floor->interfaces());
+        return perform(environment.broker(), one.request.request, baseline->interfaces());
     };
-    Outcome latest;
-    const auto timeFloor = [&] {
-        latest = {};  // both sides find the same memory in the process, and free
-        const Outcome outcome = askFloor();
-        requireAnswered(one.request, outcome);
-        return outcome.seconds;
+    TimedResponse latest;
+    const auto timeBaseline = [&] {
+        latest = {};  // frees its memory, so that both sides find the same amount
+        const TimedResponse response = performBaseline();
+        requireExpected(one.request, response);
+        return response.seconds;
     };
     const auto timeProvider = [&] {
-        latest = perform(bench.broker(), one.request, one.provider(bench));
-        requireAnswered(one.request, latest);
+        latest = perform(environment.broker(), one.request.request, one.provider(environment));
+        requireExpected(one.request, latest);
         return latest.seconds;
     };
-    timeFloor();
-    measureInTurn(state, turnsFor(one), "floor", timeFloor, "provider", timeProvider);
-    requireSame(latest.events, askFloor().events);
-    requireSameFile(bench, one);
+    timeBaseline();
+    measureInTurn(state, turnsFor(one), "baseline", timeBaseline, "provider", timeProvider);
+    requireSame(latest.events, performBaseline().events);
+    requireSameFile(environment, one);
 }
 
 /** The provider alone and behind the gate. */
-void measureGate(benchmark::State& state, Workbench& bench, const Case& one) {
-    const auto sides = one.twice(bench);
-    const std::unique_ptr<Floor> floor = one.floor(bench, bench.broker().handle());
-    const Outcome expected = perform(bench.broker(), one.request, floor->interfaces());
-    const auto time = [&](const Interfaces& side) { return secondsOf(bench, one.request, side, expected); };
+void measureGate(benchmark::State& state, Environment& environment, const Case& one) {
+    const auto sides = one.twice(environment);
+    const std::unique_ptr<Baseline> baseline = one.baseline(environment, environment.broker().handle());
+    const TimedResponse expected = perform(environment.broker(), one.request.request, baseline->interfaces());
+    const auto time = [&](const Interfaces& side) { return secondsOf(environment, one.request, side, expected); };
     measureInTurn(
         state, turnsFor(one), "alone", [&] { return time(sides.first); }, "gated", [&] { return time(sides.second); });
 }
 
-/** Registers a benchmark that measures its own time; what it throws makes it fail. */
+/** Registers a benchmark that sets its time. It fails if it throws an exception. */
 void registerBenchmark(const std::string& name, bool& failed, const std::function<void(benchmark::State&)>& body) {
     const auto guarded = [&failed, body](benchmark::State& state) {
         try {
@@ -155,42 +157,42 @@ void registerBenchmark(const std::string& name, bool& failed, const std::functio
             state.SkipWithError(failure.what());
         }
     };
-#ifndef __clang_analyzer__  // it takes the benchmark, which the library keeps, for a leak
+#ifndef __clang_analyzer__  // the library owns the benchmark, which the analyzer reports as a leak
     benchmark::RegisterBenchmark(name.c_str(), guarded)->UseManualTime()->Unit(benchmark::kMicrosecond);
 #endif
 }
 
 template <class Row>
-void measureLoading(benchmark::State& state, Workbench& bench, std::size_t size) {
-    bench.unload();
-    const std::filesystem::path file = bench.agent().data() / Row::fileName;
+void measureLoading(benchmark::State& state, Environment& environment, std::size_t size) {
+    environment.unload();
+    const std::filesystem::path file = environment.agent().data() / Row::fileName;
     writeRows(file, makeRows<Row>(size));
     const auto perRecord = [&](std::size_t bytes) { return static_cast<double>(bytes) / static_cast<double>(size); };
-    state.counters["text_per_record"] = perRecord(std::filesystem::file_size(file));
+    state.counters["file_per_record"] = perRecord(std::filesystem::file_size(file));
     for (auto _ : state) {
-        ::malloc_trim(0);  // what earlier iterations freed must not be there to be taken again
-        const Holdings before = holdings();
+        ::malloc_trim(0);  // returns memory that earlier iterations freed
+        const ProcessResources before = processResources();
         double begin = processorSeconds();
-        std::optional<SharedLibrary> library(Entrance::provided().file);
+        std::optional<cimhost::LoadedLibrary> library(std::in_place, ProviderEntry::ofProvider().file, libraryFlags);
         double seconds = processorSeconds() - begin;
-        const Holdings after = holdings();
+        const ProcessResources after = processResources();
         state.counters["bytes_per_record"] = perRecord(after.resident - before.resident);
         state.counters["table_per_record"] = perRecord(after.mapped - before.mapped);
         state.counters["pieces_per_record"] = perRecord((after.heap - after.mapped) - (before.heap - before.mapped));
         begin = processorSeconds();
         library.reset();
         state.SetIterationTime(seconds + processorSeconds() - begin);
-        if (SharedLibrary::isLoaded(Entrance::provided().file)) {
-            throw std::runtime_error("the provider library stays in the process");
+        if (isLoaded(ProviderEntry::ofProvider().file)) {
+            throw std::runtime_error("the provider library was not unloaded");
         }
     }
-    const Request request = enumInstanceNames(Row::className, size);
-    requireAnswered(request, perform(bench.broker(), request, bench.loaded<Row>(size)));
+    const ExpectedRequest request{cimhost::Request::enumerateInstanceNames(classPath(Row::className)), size};
+    requireExpected(request, perform(environment.broker(), request.request, environment.loaded<Row>(size)));
 }
 
 template <class Row>
-void measureReading(benchmark::State& state, const Workbench& bench, std::size_t size) {
-    const std::filesystem::path file = bench.agent().floorData() / Row::fileName;
+void measureReading(benchmark::State& state, const Environment& environment, std::size_t size) {
+    const std::filesystem::path file = environment.agent().baselineData() / Row::fileName;
     writeRows(file, makeRows<Row>(size));
     for (auto _ : state) {
         const double begin = processorSeconds();
@@ -205,40 +207,40 @@ void measureReading(benchmark::State& state, const Workbench& bench, std::size_t
 }
 
 template <class Row>
-void registerLoadingOf(Workbench& workbench, std::size_t size, bool& failed) {
+void registerLoadingOf(Environment& environment, std::size_t size, bool& failed) {
     const std::string name = std::string("Load/") + Row::className;
     registerBenchmark(name + "/provider/" + std::to_string(size), failed,
-                      [&workbench, size](benchmark::State& state) { measureLoading<Row>(state, workbench, size); });
-    registerBenchmark(name + "/floor/" + std::to_string(size), failed,
-                      [&workbench, size](benchmark::State& state) { measureReading<Row>(state, workbench, size); });
+                      [&environment, size](benchmark::State& state) { measureLoading<Row>(state, environment, size); });
+    registerBenchmark(name + "/baseline/" + std::to_string(size), failed,
+                      [&environment, size](benchmark::State& state) { measureReading<Row>(state, environment, size); });
 }
 
 }  // namespace
 
-void registerCase(const Case& one, Workbench& workbench, bool& failed) {
+void registerCase(const Case& one, Environment& environment, bool& failed) {
     const std::string name = one.operation + '/' + one.className;
     const auto registerSide = [&](const char* side, auto measureSide) {
         registerBenchmark(name + side + std::to_string(one.size), failed,
-                          [&workbench, one, measureSide](benchmark::State& state) {
-                              workbench.computers().count = one.computers;
-                              measureSide(state, workbench, one);
+                          [&environment, one, measureSide](benchmark::State& state) {
+                              environment.computers().count = one.computers;
+                              measureSide(state, environment, one);
                           });
     };
     registerSide("/provider/", &measureProvider);
     if (one.twice) {
         registerSide("/gate/", &measureGate);
     }
-    registerSide("/floor/", &measureFloor);
+    registerSide("/baseline/", &measureBaseline);
     registerSide("/both/", &measureBoth);
 }
 
-void registerLoading(Workbench& workbench, bool& failed) {
-    // From small to large: a table that found room in what a larger one has left would not be told from its texts.
+void registerLoading(Environment& environment, bool& failed) {
+    // From small to large, so that a table does not reuse the memory of a larger one.
     for (const std::size_t size : readSizes) {
-        registerLoadingOf<WarrantyRow>(workbench, size, failed);
-        registerLoadingOf<LeaseRow>(workbench, size, failed);
+        registerLoadingOf<WarrantyRow>(environment, size, failed);
+        registerLoadingOf<LeaseRow>(environment, size, failed);
     }
-    registerLoadingOf<LeaseRow>(workbench, largestSize, failed);
+    registerLoadingOf<LeaseRow>(environment, largestSize, failed);
 }
 
 }  // namespace bench

@@ -2,50 +2,11 @@
 
 #include <dlfcn.h>
 
-#include <stdexcept>
-#include <string>
+#include "operations/Interfaces.h"
 
 namespace bench {
 
-namespace {
-
-[[noreturn]] void failLoading(const std::string& what) {
-    const char* reason = dlerror();
-    throw std::runtime_error(what + ": " + (reason != nullptr ? reason : "no reason given"));
-}
-
-template <class Interface>
-Interface* make(const SharedLibrary& library, const std::string& factory, const CMPIBroker* broker) {
-    using Factory = Interface* (*)(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
-    CMPIStatus status{CMPI_RC_OK, nullptr};
-    Interface* made = reinterpret_cast<Factory>(library.symbol(factory.c_str()))(broker, nullptr, &status);
-    if (made == nullptr || status.rc != CMPI_RC_OK) {
-        throw std::runtime_error(factory + " made nothing");
-    }
-    return made;
-}
-
-}  // namespace
-
-SharedLibrary::SharedLibrary(const std::filesystem::path& file) : handle(dlopen(file.c_str(), RTLD_NOW | RTLD_LOCAL)) {
-    if (handle == nullptr) {
-        failLoading("cannot load " + file.string());
-    }
-}
-
-SharedLibrary::~SharedLibrary() {
-    dlclose(handle);
-}
-
-void* SharedLibrary::symbol(const char* name) const {
-    void* address = dlsym(handle, name);
-    if (address == nullptr) {
-        failLoading(std::string("no ") + name);
-    }
-    return address;
-}
-
-bool SharedLibrary::isLoaded(const std::filesystem::path& file) {
+bool isLoaded(const std::filesystem::path& file) {
     void* handle = dlopen(file.c_str(), RTLD_NOW | RTLD_NOLOAD);
     if (handle == nullptr) {
         return false;
@@ -54,28 +15,31 @@ bool SharedLibrary::isLoaded(const std::filesystem::path& file) {
     return true;
 }
 
-Entrance Entrance::provided() {
+ProviderEntry ProviderEntry::ofProvider() {
     return {BENCH_PROVIDER_LIBRARY, "LeaseAndWarrantyProvider"};
 }
 
-Entrance Entrance::gate() {
+ProviderEntry ProviderEntry::ofGate() {
     return {BENCH_GATE_LIBRARY, "LeaseAndWarrantyGate"};
 }
 
-Entrance Entrance::copyOf(const std::filesystem::path& directory) {
-    Entrance entrance = provided();
-    const std::filesystem::path copy = directory / entrance.file.filename();
-    std::filesystem::copy_file(entrance.file, copy, std::filesystem::copy_options::overwrite_existing);
-    entrance.file = copy;
-    return entrance;
+ProviderEntry ProviderEntry::ofCopy(const std::filesystem::path& directory) {
+    ProviderEntry entry = ofProvider();
+    const std::filesystem::path copy = directory / entry.file.filename();
+    std::filesystem::copy_file(entry.file, copy, std::filesystem::copy_options::overwrite_existing);
+    entry.file = copy;
+    return entry;
 }
 
-ProviderLibrary::ProviderLibrary(const Entrance& entrance, const CMPIBroker* broker) : library(entrance.file) {
-    made.instances = make<CMPIInstanceMI>(library, entrance.provider + "_Create_InstanceMI", broker);
-    made.associations = make<CMPIAssociationMI>(library, entrance.provider + "_Create_AssociationMI", broker);
+ProviderLibrary::ProviderLibrary(const ProviderEntry& entry, cimhost::Broker& broker)
+    : library(entry.file, libraryFlags) {
+    using cimhost::FactoryChoice;
+    created = {cimhost::createInterface<CMPIInstanceMI>(library, entry.name, broker, FactoryChoice::named),
+               cimhost::createInterface<CMPIAssociationMI>(library, entry.name, broker, FactoryChoice::named)};
 }
 
-AgentLibraries::AgentLibraries() : logging(BENCH_LOGGING_LIBRARY), framework(BENCH_FRAMEWORK_LIBRARY) {}
+AgentLibraries::AgentLibraries()
+    : logging(BENCH_LOGGING_LIBRARY, libraryFlags), framework(BENCH_FRAMEWORK_LIBRARY, libraryFlags) {}
 
 std::array<std::filesystem::path, 2> AgentLibraries::files() {
     return {BENCH_LOGGING_LIBRARY, BENCH_FRAMEWORK_LIBRARY};

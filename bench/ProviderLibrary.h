@@ -1,65 +1,54 @@
 #pragma once
 
-#include "Requests.h"
-
 #include <array>
 #include <filesystem>
 #include <string>
 
+#include "Requests.h"
+#include "operations/LoadedLibrary.h"
+
 namespace bench {
 
-/** A shared library in this process. */
-class SharedLibrary {
-public:
-    /** @throws std::runtime_error with the loader's reason */
-    explicit SharedLibrary(const std::filesystem::path& file);
-    ~SharedLibrary();
-    SharedLibrary(const SharedLibrary&) = delete;
-    SharedLibrary& operator=(const SharedLibrary&) = delete;
+/** The dlopen flags of all libraries. */
+constexpr int libraryFlags = RTLD_NOW | RTLD_LOCAL;
 
-    /** The address of a symbol. @throws std::runtime_error when there is none of that name */
-    void* symbol(const char* name) const;
+/** Whether a library is loaded in this process. */
+bool isLoaded(const std::filesystem::path& file);
 
-    /** Whether a library is in the process, without loading it. */
-    static bool isLoaded(const std::filesystem::path& file);
-
-private:
-    void* handle;
-};
-
-/** What an object manager loads: a library, and the name of the provider that it looks for there. */
-struct Entrance {
+/** A provider that an object manager loads. */
+struct ProviderEntry {
     std::filesystem::path file;
-    std::string provider;
+    std::string name;  ///< prefix of its factories
 
-    static Entrance provided();                                      ///< the provider itself
-    static Entrance gate();                                          ///< the gate that has the provider behind it
-    static Entrance copyOf(const std::filesystem::path& directory);  ///< a copy of the provider, made there
+    static ProviderEntry ofProvider();
+    static ProviderEntry ofGate();
+
+    /** Copies the provider's library to a directory. */
+    static ProviderEntry ofCopy(const std::filesystem::path& directory);
 };
 
-/** The library of an entrance with its two interfaces, loaded as long as this lives. */
+/** The library of a provider and its two interfaces, loaded for the lifetime of this object. */
 class ProviderLibrary {
 public:
-    ProviderLibrary(const Entrance& entrance, const CMPIBroker* broker);
+    ProviderLibrary(const ProviderEntry& entry, cimhost::Broker& broker);
 
-    Interfaces interfaces() const { return made; }
+    Interfaces interfaces() const { return created; }
 
 private:
-    SharedLibrary library;
-    Interfaces made{};
+    cimhost::LoadedLibrary library;
+    Interfaces created{};
 };
 
-/** The agent's framework and logging libraries, which stay loaded while the provider comes and goes. */
+/** The agent's framework and logging libraries, which stay loaded while the provider is loaded and unloaded. */
 class AgentLibraries {
 public:
     AgentLibraries();
 
-    /** Where they are. */
     static std::array<std::filesystem::path, 2> files();
 
 private:
-    SharedLibrary logging;
-    SharedLibrary framework;
+    cimhost::LoadedLibrary logging;
+    cimhost::LoadedLibrary framework;
 };
 
 }  // namespace bench

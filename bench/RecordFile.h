@@ -4,57 +4,58 @@
 #include <filesystem>
 #include <fstream>
 #include <string>
+#include <string_view>
 #include <vector>
 
-/** Record files read and written with no more than the format asks for: streams, escapes, a flush a line. */
+#include "cim/DateTime.h"
+
+/** Reads and writes record files without more work than the format requires: streams, escapes, a flush per line. */
 namespace bench {
 
-constexpr const char* noDateInFile = "00000000000000.000000-000";
-
-inline std::string replaced(std::string text, char from, char to) {
-    std::replace(text.begin(), text.end(), from, to);
-    return text;
+inline std::string replaced(std::string value, char from, char to) {
+    std::replace(value.begin(), value.end(), from, to);
+    return value;
 }
 
-/** Writes the fields of a row, one a line, each line flushed, as the provider does. */
+/** Writes the fields of a row, one per line, with a flush per line, as the provider does. */
 class FieldWriter {
 public:
     explicit FieldWriter(std::ofstream& itsStream) : stream(itsStream) {}
 
-    void identifier(const std::string& text) { line(replaced(text, ' ', '_')); }
-    void value(const std::string& text) { line(text.size() <= 1 ? "*" : replaced(text, ' ', '_')); }
-    void date(const std::string& text) { line(text.empty() ? noDateInFile : text); }
+    void identifier(const std::string& id) { line(replaced(id, ' ', '_')); }
+    void value(const std::string& value) { line(value.size() <= 1 ? "*" : replaced(value, ' ', '_')); }
+    void date(const std::string& date) { line(date.empty() ? cim::noDate : std::string_view(date)); }
     void number(unsigned int number) { line(number); }
     void flag(bool flag) { line(flag ? '1' : '0'); }
 
 private:
     template <class Value>
-    void line(const Value& value) {
-        stream << value << '\n' << std::flush;
+    void line(const Value& field) {
+        stream << field << '\n' << std::flush;
     }
 
     std::ofstream& stream;
 };
 
-/** Reads what FieldWriter writes. */
+/** Reads the format of FieldWriter. */
 class FieldReader {
 public:
     explicit FieldReader(std::ifstream& itsStream) : stream(itsStream) {}
 
-    void identifier(std::string& text) {
-        stream >> text;
-        std::replace(text.begin(), text.end(), '_', ' ');
+    void identifier(std::string& id) {
+        stream >> id;
+        std::replace(id.begin(), id.end(), '_', ' ');
     }
-    void value(std::string& text) {
-        identifier(text);
-        if (text == "*") {
-            text.clear();
+    void value(std::string& value) {
+        identifier(value);
+        if (value == "*") {
+            value.clear();
         }
     }
-    void date(std::string& text) {
-        stream >> text;
-        if (text == noDateInFile) {
-            text.clear();
+    void date(std::string& date) {
+        stream >> date;
+        if (date == cim::noDate) {
+            date.clear();
         }
     }
     void number(unsigned int& number) { stream >> number; }

@@ -1,23 +1,27 @@
 #include "Requests.h"
 
-#include "Rows.h"
-#include "broker/RequestScope.h"
-#include "schema/MofWriter.h"
-#include "schema/ObjectPathText.h"
-
+#include <algorithm>
 #include <ctime>
+#include <functional>
 #include <stdexcept>
 #include <utility>
 #include <variant>
+
+#include "Rows.h"
+#include "broker/RequestScope.h"
+#include "operations/RequestRunner.h"
+#include "operations/StatusText.h"
+#include "schema/MofWriter.h"
+#include "schema/ObjectPathText.h"
 
 namespace bench {
 
 namespace {
 
-/** The association whose ends the requests ask for. */
-constexpr const char* associationClass = "VELKO_LeaseSetting";
+using cimhost::Operation;
+using cimhost::ResultEvent;
 
-/** The one property whose value depends on when it is asked for. */
+/** The only property whose value depends on the time of the request. */
 constexpr const char* presentTime = "LocalDateTime";
 
 std::string described(const cimhost::NamedValue& property) {
@@ -25,60 +29,27 @@ std::string described(const cimhost::NamedValue& property) {
     return property.name + ':' + std::to_string(property.value.type) + '=' + value + '\n';
 }
 
-std::string described(const cimhost::ResultEvent& event) {
+std::string described(const ResultEvent& event) {
     if (const auto* path = std::get_if<cimhost::ObjectPath>(&event)) {
         return cimhost::formatObjectPath(*path);
     }
     if (const auto* instance = std::get_if<cimhost::Instance>(&event)) {
-        std::string text = cimhost::formatObjectPath(instance->path) + '\n';
+        std::string description = cimhost::formatObjectPath(instance->path) + '\n';
         for (const cimhost::NamedValue& property : instance->properties) {
-            text += described(property);
+            description += described(property);
         }
-        return text;
+        return description;
     }
     return std::holds_alternative<cimhost::Done>(event) ? "done" : "neither path nor instance";
 }
 
-CMPIStatus callEnumInstances(const Interfaces& interfaces, const CallArguments& call) {
-    CMPIInstanceMI* mi = interfaces.instances;
-    return mi->ft->enumerateInstances(mi, call.context, call.result, call.path, nullptr);
+bool takesInstance(Operation operation) {
+    return operation == Operation::createInstance || operation == Operation::modifyInstance;
 }
 
-CMPIStatus callEnumInstanceNames(const Interfaces& interfaces, const CallArguments& call) {
-    CMPIInstanceMI* mi = interfaces.instances;
-    return mi->ft->enumerateInstanceNames(mi, call.context, call.result, call.path);
-}
-
-CMPIStatus callGetInstance(const Interfaces& interfaces, const CallArguments& call) {
-    CMPIInstanceMI* mi = interfaces.instances;
-    return mi->ft->getInstance(mi, call.context, call.result, call.path, nullptr);
-}
-
-CMPIStatus callCreateInstance(const Interfaces& interfaces, const CallArguments& call) {
-    CMPIInstanceMI* mi = interfaces.instances;
-    return mi->ft->createInstance(mi, call.context, call.result, call.path, call.instance);
-}
-
-CMPIStatus callModifyInstance(const Interfaces& interfaces, const CallArguments& call) {
-    CMPIInstanceMI* mi = interfaces.instances;
-    return mi->ft->modifyInstance(mi, call.context, call.result, call.path, call.instance, nullptr);
-}
-
-CMPIStatus callDeleteInstance(const Interfaces& interfaces, const CallArguments& call) {
-    CMPIInstanceMI* mi = interfaces.instances;
-    return mi->ft->deleteInstance(mi, call.context, call.result, call.path);
-}
-
-CMPIStatus callAssociators(const Interfaces& interfaces, const CallArguments& call) {
-    CMPIAssociationMI* mi = interfaces.associations;
-    return mi->ft->associators(mi, call.context, call.result, call.path, associationClass, nullptr, nullptr, nullptr,
-                               nullptr);
-}
-
-CMPIStatus callAssociatorNames(const Interfaces& interfaces, const CallArguments& call) {
-    CMPIAssociationMI* mi = interfaces.associations;
-    return mi->ft->associatorNames(mi, call.context, call.result, call.path, associationClass, nullptr, nullptr,
-                                   nullptr);
+/** Whether the provider calls returnDone. */
+bool isEnded(Operation operation) {
+    return operation != Operation::modifyInstance && operation != Operation::deleteInstance;
 }
 
 }  // namespace
@@ -89,94 +60,79 @@ double processorSeconds() {
     return static_cast<double>(time.tv_sec) + 1e-9 * static_cast<double>(time.tv_nsec);
 }
 
-Outcome perform(cimhost::Broker& broker, const Request& request, const Interfaces& interfaces) {
-    Outcome outcome;
+TimedResponse perform(cimhost::Broker& broker, const cimhost::Request& request, const Interfaces& interfaces) {
+    TimedResponse response;
     cimhost::RequestScope scope(broker);
-    const CMPIInstance* instance = request.instance ? scope.instance(*request.instance) : nullptr;
-    const CallArguments arguments{scope.context({}), scope.result(outcome.events), scope.objectPath(request.path),
-                                  instance};
+    const CMPIContext* context = scope.context({});
+    const CMPIResult* result = scope.result(response.events);
+    const CMPIObjectPath* path = scope.objectPath(request.path);
+    const CMPIInstance* instance = takesInstance(request.operation) ? scope.instance(request.instance) : nullptr;
+    const bool isAssociation = cimhost::isAssociationOperation(request.operation);
     const double begin = processorSeconds();
-    const CMPIStatus status = request.operation(interfaces, arguments);
-    outcome.seconds = processorSeconds() - begin;
-    outcome.status = cimhost::statusFrom(status);
-    return outcome;
+    const CMPIStatus status =
+        isAssociation ? cimhost::callOperation(interfaces.associations, request, context, result, path)
+                      : cimhost::callOperation(interfaces.instances, request, context, result, path, instance);
+    response.seconds = processorSeconds() - begin;
+    response.status = cimhost::statusFrom(status);
+    return response;
 }
 
-void requireAnswered(const Request& request, const Outcome& outcome) {
-    if (!outcome.status.ok()) {
-        throw std::runtime_error("status " + std::to_string(outcome.status.rc) + ' ' + outcome.status.message);
-    }
-    const std::size_t expected = request.answers + (request.ends ? 1 : 0);
-    if (outcome.events.size() != expected) {
-        throw std::runtime_error(std::to_string(outcome.events.size()) + " things were returned, not " +
-                                 std::to_string(expected));
-    }
-    if (request.ends && !std::holds_alternative<cimhost::Done>(outcome.events.back())) {
-        throw std::runtime_error("the answer was not ended");
+void requireExpected(const ExpectedRequest& expected, const TimedResponse& response) {
+    const auto isDone = [](const ResultEvent& event) { return std::holds_alternative<cimhost::Done>(event); };
+    const auto results = std::count_if(response.events.begin(), response.events.end(), std::not_fn(isDone));
+    const bool mustBeDone = expected.rc == CMPI_RC_OK && isEnded(expected.request.operation);
+    const bool lacksDone = mustBeDone && (response.events.empty() || !isDone(response.events.back()));
+    if (response.status.rc != expected.rc || static_cast<std::size_t>(results) != expected.results || lacksDone) {
+        throw std::runtime_error(std::string(nameOf(expected.request.operation)) + " of " +
+                                 cimhost::formatObjectPath(expected.request.path) + ": " +
+                                 cimhost::errorText(response.status) + ", expected " + std::to_string(expected.rc) +
+                                 "; " + std::to_string(results) + " results, expected " +
+                                 std::to_string(expected.results) + (lacksDone ? "; returnDone is not the last" : ""));
     }
 }
 
-void requireSame(const cimhost::ResultEvents& answers, const cimhost::ResultEvents& expected) {
-    if (answers.size() != expected.size()) {
-        throw std::runtime_error(std::to_string(answers.size()) + " answers, not " + std::to_string(expected.size()));
+void requireSame(const cimhost::ResultEvents& results, const cimhost::ResultEvents& expected) {
+    if (results.size() != expected.size()) {
+        throw std::runtime_error(std::to_string(results.size()) + " results, expected " +
+                                 std::to_string(expected.size()));
     }
-    for (std::size_t index = 0; index < answers.size(); ++index) {
-        const std::string answer = described(answers[index]);
+    for (std::size_t index = 0; index < results.size(); ++index) {
+        const std::string found = described(results[index]);
         const std::string wanted = described(expected[index]);
-        if (answer != wanted) {
-            std::string difference = "answer " + std::to_string(index) + " is\n";
-            difference.append(answer).append("\nand not\n").append(wanted);
-            throw std::runtime_error(difference);
+        if (found != wanted) {
+            throw std::runtime_error("result " + std::to_string(index) + " is\n" + found + "\nexpected\n" + wanted);
         }
     }
 }
 
 cimhost::ObjectPath classPath(const std::string& className) {
-    cimhost::ObjectPath path;
-    path.nameSpace = names::nameSpace;
-    path.className = className;
-    return path;
+    return {{}, names::nameSpace, className, {}};
 }
 
-cimhost::NamedValue textValue(const std::string& name, const std::string& text) {
-    return {name, cimhost::Value::of(text)};
+cimhost::ObjectPath recordPath(const std::string& className, const std::string& instanceId) {
+    return {{}, names::nameSpace, className, {namedString("InstanceID", instanceId)}};
 }
 
-Request enumInstances(const std::string& className, std::size_t answers) {
-    return {&callEnumInstances, classPath(className), std::nullopt, answers, true};
+cimhost::ObjectPath computerPath(const std::string& name) {
+    return {{}, names::nameSpace, names::computerClass, {namedString("Name", name)}};
 }
 
-Request enumInstanceNames(const std::string& className, std::size_t answers) {
-    return {&callEnumInstanceNames, classPath(className), std::nullopt, answers, true};
+cimhost::NamedValue namedString(const std::string& name, const std::string& value) {
+    return {name, cimhost::Value::of(value)};
 }
 
-Request getInstance(cimhost::ObjectPath path) {
-    return {&callGetInstance, std::move(path), std::nullopt, 1, true};
+cimhost::Request creation(const cimhost::ObjectPath& path) {
+    return cimhost::Request::createInstance(path, {path, {}});
 }
 
-Request createInstance(cimhost::ObjectPath path) {
-    cimhost::Instance instance;
-    instance.path = path;
-    return {&callCreateInstance, std::move(path), std::move(instance), 1, true};
+cimhost::Request modification(const cimhost::ObjectPath& path, cimhost::NamedValue property) {
+    return cimhost::Request::modifyInstance(path, {path, {std::move(property)}});
 }
 
-Request modifyInstance(cimhost::ObjectPath path, cimhost::NamedValue property) {
-    cimhost::Instance instance;
-    instance.path = path;
-    instance.properties.push_back(std::move(property));
-    return {&callModifyInstance, std::move(path), std::move(instance), 0, false};
-}
-
-Request deleteInstance(cimhost::ObjectPath path) {
-    return {&callDeleteInstance, std::move(path), std::nullopt, 0, false};
-}
-
-Request associators(cimhost::ObjectPath path, std::size_t answers) {
-    return {&callAssociators, std::move(path), std::nullopt, answers, true};
-}
-
-Request associatorNames(cimhost::ObjectPath path, std::size_t answers) {
-    return {&callAssociatorNames, std::move(path), std::nullopt, answers, true};
+cimhost::AssociationFilter leaseSettings() {
+    cimhost::AssociationFilter filter;
+    filter.associationClass = names::leaseSettingClass;
+    return filter;
 }
 
 }  // namespace bench

@@ -1,47 +1,33 @@
 #pragma once
 
-#include "broker/Broker.h"
-#include "model/ResultEvent.h"
-#include "model/Status.h"
-#include "model/Value.h"
-
 #include <cmpift.h>
 
 #include <cstddef>
-#include <optional>
 #include <string>
 
-/** Requests to a provider through its function tables, timed and checked. */
+#include "broker/Broker.h"
+#include "model/Request.h"
+#include "model/ResultEvent.h"
+#include "model/Status.h"
+
+/** Timed requests to a provider's function tables. */
 namespace bench {
 
-/** The two interfaces of a provider; they belong to it. Null for one that it has not. */
+/** The interfaces of a provider, which owns them; null if it does not have one. */
 struct Interfaces {
     CMPIInstanceMI* instances = nullptr;
     CMPIAssociationMI* associations = nullptr;
 };
 
-/** What an operation is called with; all of it belongs to the request. */
-struct CallArguments {
-    const CMPIContext* context;
-    const CMPIResult* result;
-    const CMPIObjectPath* path;
-    const CMPIInstance* instance;  ///< null for a request that has none
+/** A request and the response that it must have. */
+struct ExpectedRequest {
+    cimhost::Request request;
+    std::size_t results = 0;  ///< number of instances or paths
+    int rc = CMPI_RC_OK;
 };
 
-/** One call into a function table. */
-using Operation = CMPIStatus (*)(const Interfaces& interfaces, const CallArguments& arguments);
-
-/** A request and what a right answer to it is made of. */
-struct Request {
-    Operation operation;
-    cimhost::ObjectPath path;
-    std::optional<cimhost::Instance> instance;  ///< of a modification
-    std::size_t answers;                        ///< instances or paths that are returned
-    bool ends;                                  ///< whether the provider says that it is done
-};
-
-/** What became of a request. */
-struct Outcome {
+/** The response to a request, and its time. */
+struct TimedResponse {
     double seconds = 0;  ///< processor time, user and system, from the call into the function table to its return
     cimhost::Status status{};
     cimhost::ResultEvents events{};
@@ -50,31 +36,46 @@ struct Outcome {
 /** The processor time that this thread has used, in seconds. */
 double processorSeconds();
 
-/** Runs a request in a scope of its own. Making its arguments and freeing what the provider made are not timed. */
-Outcome perform(cimhost::Broker& broker, const Request& request, const Interfaces& interfaces);
-
-/** @throws std::runtime_error when the status is not OK, or the number of answers is not what is expected */
-void requireAnswered(const Request& request, const Outcome& outcome);
+/** Performs a request. Its time does not include creating the arguments and freeing the provider's objects. */
+TimedResponse perform(cimhost::Broker& broker, const cimhost::Request& request, const Interfaces& interfaces);
 
 /**
- * Compares answers as a whole: order, classes, namespaces, keys, properties with types and values.
+ * Checks the status, the number of results and, of a read that is OK, that the provider called returnDone last.
+ * @throws std::runtime_error with the difference
+ */
+void requireExpected(const ExpectedRequest& expected, const TimedResponse& response);
+
+/**
+ * Compares results: order, classes, namespaces, keys, properties with types and values.
  * @throws std::runtime_error with the first difference
  */
-void requireSame(const cimhost::ResultEvents& answers, const cimhost::ResultEvents& expected);
+void requireSame(const cimhost::ResultEvents& results, const cimhost::ResultEvents& expected);
 
-/** @name Requests */
+/** @name Paths and values of requests */
 ///@{
 cimhost::ObjectPath classPath(const std::string& className);
-cimhost::NamedValue textValue(const std::string& name, const std::string& text);
+cimhost::ObjectPath recordPath(const std::string& className, const std::string& instanceId);
+cimhost::ObjectPath computerPath(const std::string& name);
+cimhost::NamedValue namedString(const std::string& name, const std::string& value);
 
-Request enumInstances(const std::string& className, std::size_t answers);
-Request enumInstanceNames(const std::string& className, std::size_t answers);
-Request getInstance(cimhost::ObjectPath path);
-Request createInstance(cimhost::ObjectPath path);
-Request modifyInstance(cimhost::ObjectPath path, cimhost::NamedValue property);
-Request deleteInstance(cimhost::ObjectPath path);
-Request associators(cimhost::ObjectPath path, std::size_t answers);
-Request associatorNames(cimhost::ObjectPath path, std::size_t answers);
+/** The path of the only instance of a product class, which is not a record. */
+template <class Row>
+cimhost::ObjectPath productPath(const Row& row) {
+    cimhost::ObjectPath path = classPath(Row::className);
+    for (const auto& key : Row::keys) {
+        path.keys.push_back(namedString(key.name, row.*key.member));
+    }
+    return path;
+}
+
+/** A creation with the keys of the path only. */
+cimhost::Request creation(const cimhost::ObjectPath& path);
+
+/** A modification of one property. */
+cimhost::Request modification(const cimhost::ObjectPath& path, cimhost::NamedValue property);
+
+/** The filter for the association between computers and leases. */
+cimhost::AssociationFilter leaseSettings();
 ///@}
 
 }  // namespace bench

@@ -40,10 +40,10 @@ const AssetRow::Stored AssetRow::profileDate{"ZOPMUpdateTime", "USER.ZOPMUpdateT
 
 namespace {
 
-/** The n-th of some texts, again from the first after the last. */
+/** One of some strings, in turn. */
 template <std::size_t count>
-std::string oneOf(const std::array<const char*, count>& texts, std::size_t index) {
-    return texts[index % count];
+std::string oneOf(const std::array<const char*, count>& strings, std::size_t index) {
+    return strings[index % count];
 }
 
 constexpr std::array<const char*, 4> parties{"ACME Leasing Co", "Example Leasing and Finance Ltd", "Lessor 3",
@@ -56,9 +56,9 @@ constexpr std::array<const char*, 4> commencements{"20260101000000.000000+000", 
 constexpr std::array<const char*, 4> amounts{"1250.00 EUR", "89.90 USD", "", "120000.00 EUR per annum"};
 
 template <class Rows>
-void append(std::string& text, const Rows& rows) {
+void append(std::string& content, const Rows& rows) {
     for (const AssetRow::Stored& row : rows) {
-        text += std::string(row.fileKey) + '=' + row.value + '\n';
+        content += std::string(row.fileKey) + '=' + row.value + '\n';
     }
 }
 
@@ -102,9 +102,9 @@ std::string instanceIdOf(std::size_t index, std::size_t size) {
     if (index == size / 2) {
         return names::computerNode;
     }
-    char text[32];
-    std::snprintf(text, sizeof text, "record %08zu", index);
-    return text;
+    char id[32];
+    std::snprintf(id, sizeof id, "record %08zu", index);
+    return id;
 }
 
 template <>
@@ -129,14 +129,14 @@ std::vector<AssetRow> makeRows(std::size_t size) {
         size, {names::systemNode, names::computer, names::vendor, names::agentVersion, names::computerModel});
 }
 
-std::string assetFileText() {
-    std::string text;
-    append(text, AssetRow::owner);
-    append(text, AssetRow::asset);
-    append(text, AssetRow::personalized);
-    append(text, AssetRow::dates);
-    append(text, std::array<AssetRow::Stored, 3>{AssetRow::location, AssetRow::profile, AssetRow::profileDate});
-    return text;
+std::string assetFileContent() {
+    std::string content;
+    append(content, AssetRow::owner);
+    append(content, AssetRow::asset);
+    append(content, AssetRow::personalized);
+    append(content, AssetRow::dates);
+    append(content, std::array<AssetRow::Stored, 3>{AssetRow::location, AssetRow::profile, AssetRow::profileDate});
+    return content;
 }
 
 }  // namespace bench

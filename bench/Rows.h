@@ -6,15 +6,14 @@
 #include <vector>
 
 /**
- * The data of the benchmarks as plain structs: what the provider is loaded with, and what the floor serves
- * directly.
+ * The data of the benchmarks as plain structs, which are written to the provider's files and which the baseline serves.
  *
- * Each struct tells the CIM class that it stands for, its keys, and its properties in the order in which the
- * provider fills them. Records also tell the fields of their file, in file order.
+ * Each struct has the name of its CIM class, its keys, and its properties in the order in which the provider sets them.
+ * Records also have the fields of their file, in file order.
  */
 namespace bench {
 
-/** A key of a class: its name and the member that holds it. */
+/** A key of a class: its name and its member. */
 template <class Row>
 struct Key {
     const char* name;
@@ -27,7 +26,7 @@ struct LeaseRow {
 
     std::string instanceId{};
     std::string lessor{};
-    std::string commencement{};  ///< CIM datetime text; empty for no date
+    std::string commencement{};  ///< CIM datetime; empty: none
     unsigned int term = 0;
     bool earlyTermination = false;
     bool fixedPricePurchase = false;
@@ -40,23 +39,23 @@ struct LeaseRow {
     unsigned int rateFactor = 0;
 
     static constexpr std::array<Key<LeaseRow>, 1> keys{{{"InstanceID", &LeaseRow::instanceId}}};
-    static constexpr Key<LeaseRow> modified{"Lessor", &LeaseRow::lessor};  ///< what modifications change
+    static constexpr Key<LeaseRow> modified{"Lessor", &LeaseRow::lessor};  ///< the property that modifications change
 
     template <class Set>
     void eachProperty(const Set& set) const {
-        set.text("InstanceID", instanceId);
-        set.text("ElementName", "Lease Information");
-        set.text("Lessor", lessor);
+        set.string("InstanceID", instanceId);
+        set.string("ElementName", "Lease Information");
+        set.string("Lessor", lessor);
         set.date("BaseTermCommencementDate", commencement);
         set.number("LeaseTerm", term);
         set.flag("EarlyTerminationOption", earlyTermination);
         set.flag("FixedPricePurchaseOption", fixedPricePurchase);
         set.flag("RenewalOption", renewal);
         set.flag("BargainRenewalOption", bargainRenewal);
-        set.text("BaseRent", baseRent);
-        set.text("FairMarketRental", marketRental);
-        set.text("FairMarketValue", marketValue);
-        set.text("TerminationValue", terminationValue);
+        set.string("BaseRent", baseRent);
+        set.string("FairMarketRental", marketRental);
+        set.string("FairMarketValue", marketValue);
+        set.string("TerminationValue", terminationValue);
         set.number("NetMonthlyLeaseRateFactor", rateFactor);
     }
 
@@ -84,7 +83,7 @@ struct WarrantyRow {
 
     std::string instanceId{};
     std::string warrantor{};
-    std::string commencement{};  ///< CIM datetime text; empty for no date
+    std::string commencement{};  ///< CIM datetime; empty: none
     unsigned int duration = 0;
 
     static constexpr std::array<Key<WarrantyRow>, 1> keys{{{"InstanceID", &WarrantyRow::instanceId}}};
@@ -92,11 +91,11 @@ struct WarrantyRow {
 
     template <class Set>
     void eachProperty(const Set& set) const {
-        set.text("InstanceID", instanceId);
-        set.text("ElementName", "Warranty Information");
+        set.string("InstanceID", instanceId);
+        set.string("ElementName", "Warranty Information");
         set.date("WarrantyStartDate", commencement);
         set.number("WarrantyDuration", duration);
-        set.text("Warrantor", warrantor);
+        set.string("Warrantor", warrantor);
     }
 
     template <class Row, class Visitor>
@@ -126,29 +125,29 @@ struct AgentRow {
 
     template <class Set>
     void eachProperty(const Set& set) const {
-        set.text("Caption", "VEL Ostrel");
-        set.text("Description", "VEL Ostrel");
-        set.text("BuildNumber", buildNumber);
-        set.text("Status", "OK");
-        set.text("Name", name);
-        set.text("ProductName", productName);
-        set.text("IdentifyingNumber", identifyingNumber);
-        set.text("Vendor", vendor);
-        set.text("Version", version);
+        set.string("Caption", "VEL Ostrel");
+        set.string("Description", "VEL Ostrel");
+        set.string("BuildNumber", buildNumber);
+        set.string("Status", "OK");
+        set.string("Name", name);
+        set.string("ProductName", productName);
+        set.string("IdentifyingNumber", identifyingNumber);
+        set.string("Vendor", vendor);
+        set.string("Version", version);
     }
 };
 
 struct AssetRow {
     static constexpr const char* className = "VELKO_AssetIDDetails";
 
-    /** A property that the asset file holds, under a key of its own. */
+    /** A property that is stored in the asset file. */
     struct Stored {
         const char* property;
         const char* fileKey;
         const char* value;
     };
 
-    /** Only so many of the properties are stored; a text property and a datetime property may share a key. */
+    /** The stored properties. A string and a datetime property may have the same key. */
     static const std::array<Stored, 4> owner;
     static const std::array<Stored, 2> asset;
     static const std::array<Stored, 10> personalized;
@@ -170,14 +169,14 @@ struct AssetRow {
 
     template <class Set>
     void eachProperty(const Set& set) const {
-        const auto stored = [&](const Stored& one) { set.text(one.property, one.value); };
-        set.text("IdentifyingNumber", identifyingNumber);
-        set.text("Name", name);
-        set.text("Vendor", vendor);
-        set.text("Version", version);
-        set.text("Caption", "Asset ID Information");
-        set.text("Description", "Asset ID Information");
-        set.text("CSName", name);
+        const auto stored = [&](const Stored& one) { set.string(one.property, one.value); };
+        set.string("IdentifyingNumber", identifyingNumber);
+        set.string("Name", name);
+        set.string("Vendor", vendor);
+        set.string("Version", version);
+        set.string("Caption", "Asset ID Information");
+        set.string("Description", "Asset ID Information");
+        set.string("CSName", name);
         for (const Stored& one : owner) {
             stored(one);
         }
@@ -185,7 +184,7 @@ struct AssetRow {
         for (const Stored& one : asset) {
             stored(one);
         }
-        set.text("ProductName", productName);
+        set.string("ProductName", productName);
         for (const Stored& one : personalized) {
             stored(one);
         }
@@ -193,10 +192,10 @@ struct AssetRow {
             set.date(one.property, one.value);
         }
         stored(location);
-        set.date("LocalDateTime", profileDate.value);  // the provider's is the present time
+        set.date("LocalDateTime", profileDate.value);  // of the provider, the current time
         stored(profile);
         set.date(profileDate.property, profileDate.value);
-        set.text("DeploymentProfile", profile.value);
+        set.string("DeploymentProfile", profile.value);
         set.date("DeploymentUpdateTime", profileDate.value);
     }
 };
@@ -213,19 +212,21 @@ constexpr const char* computer = "benchhost";
 constexpr const char* computerModel = "Model X";
 constexpr const char* systemNode = "/system";
 constexpr const char* computerNode = "/system/computer";  ///< identifier of the computer's lease
+constexpr const char* computerClass = "VELKO_ComputerSystem";
+constexpr const char* leaseSettingClass = "VELKO_LeaseSetting";
 }  // namespace names
 
 /**
- * The identifier of a record in a table of that size. The middle one is that of the computer's lease, so that the
- * associations have something to find.
+ * The identifier of a record in a table of this size. The middle record belongs to the computer, so that there is an
+ * association.
  */
 std::string instanceIdOf(std::size_t index, std::size_t size);
 
-/** A table of that many records; of the agent and the asset data there is one. */
+/** A table of this many records; the agent and the asset data have one. */
 template <class Row>
 std::vector<Row> makeRows(std::size_t size);
 
-/** The asset file that gives the values of AssetRow. */
-std::string assetFileText();
+/** The content of the asset file with the values of AssetRow. */
+std::string assetFileContent();
 
 }  // namespace bench

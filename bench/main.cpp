@@ -9,23 +9,23 @@
 
 namespace {
 
-void registerAll(bench::Workbench& workbench, bool& failed) {
-    bench::registerLoading(workbench, failed);
+void registerAll(bench::Environment& environment, bool& failed) {
+    bench::registerLoading(environment, failed);
     for (const auto& cases : {bench::recordCases(), bench::productCases(), bench::associationCases()}) {
         for (const bench::Case& one : cases) {
-            bench::registerCase(one, workbench, failed);
+            bench::registerCase(one, environment, failed);
         }
     }
 }
 
-/** @return whether some benchmark was run and every answer was right */
+/** @return whether a benchmark ran and all responses were right */
 bool run() {
-    bench::Workbench workbench;
+    bench::Environment environment;
     bool failed = false;
-    registerAll(workbench, failed);
+    registerAll(environment, failed);
     const bool any = benchmark::RunSpecifiedBenchmarks() > 0;
     if (failed) {
-        std::cerr << "Some answers were wrong: see the errors above.\n";
+        std::cerr << "Some responses were wrong: see the errors above.\n";
     }
     return any && !failed;
 }
@@ -33,7 +33,7 @@ bool run() {
 }  // namespace
 
 int main(int argc, char** argv) {
-    // Memory that was used once stays in the process: else large answers are measured with the kernel's work for it.
+    // Keep freed memory in the process; otherwise the kernel's work for it is measured with large responses.
     mallopt(M_TRIM_THRESHOLD, std::numeric_limits<int>::max());
     benchmark::Initialize(&argc, argv);
     if (benchmark::ReportUnrecognizedArguments(argc, argv)) {

@@ -1,9 +1,9 @@
 #!/usr/bin/env python3
-"""Tells how often the enumerations of leases miss the processor's caches, in the provider and in the floor.
+"""Counts the cache misses of enumerations of leases, in the provider and in the baseline.
 
 usage: bench/misses.py BUILD_DIRECTORY
 
-valgrind's callgrind plays the caches, so the figures repeat whatever machine counts. Its caches are small, so that
+valgrind's callgrind simulates the caches, so the figures do not depend on the machine. Its caches are small, so that
 10,000 leases overflow them as 1,000,000 do those of a real processor.
 """
 
@@ -23,7 +23,7 @@ SIZES = (100, 1000, 10000)
 
 
 def events(program, request, function):
-    """{event: count} inside of a function, as callgrind names the events."""
+    """{event: count} in the functions that match a pattern, with callgrind's names of events."""
     with tempfile.TemporaryDirectory() as directory:
         command = ["valgrind", "--tool=callgrind", "--cache-sim=yes", *CACHES, "--compress-strings=no",
                    f"--callgrind-out-file={directory}/out", f"--toggle-collect={function}", str(program),
@@ -37,7 +37,7 @@ def events(program, request, function):
 
 
 def row(one, size, counted):
-    """Instructions, accesses to data, and misses of the first and of the last cache, all a record."""
+    """Instructions, data accesses, and misses of the first and last cache, all per record."""
     accesses, first, last = (sum(counted[event] for event in names)
                              for names in (("Dr", "Dw"), ("D1mr", "D1mw"), ("DLmr", "DLmw")))
     cells = " | ".join(f"{number / size:,.1f}" for number in (counted["Ir"], accesses, first, last))
@@ -45,11 +45,11 @@ def row(one, size, counted):
 
 
 def main():
-    parser = argparse.ArgumentParser(description="Tells how often enumerations miss the processor's caches.")
+    parser = argparse.ArgumentParser(description="Counts the cache misses of enumerations.")
     parser.add_argument("build_directory", type=pathlib.Path)
     program = parser.parse_args().build_directory / "bin" / "provider_benchmark"
     work = [((operation, side), size, function) for operation, *functions in (instructions.ENUM, instructions.NAMES)
-            for side, function in zip(("provider", "floor"), functions) for size in SIZES]
+            for side, function in zip(("provider", "baseline"), functions) for size in SIZES]
     with concurrent.futures.ThreadPoolExecutor(os.cpu_count()) as workers:
         counted = workers.map(lambda each: events(program, f"{each[0][0]}/VELKO_Lease/{each[0][1]}/{each[1]}", each[2]),
                               work)

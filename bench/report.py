@@ -1,12 +1,12 @@
 #!/usr/bin/env python3
-"""Runs the benchmarks and writes their figures, docs/performance-figures.md, and the picture docs/performance.svg.
+"""Runs the benchmarks and writes docs/performance-figures.md and docs/performance.svg.
 
 usage: bench/report.py BUILD_DIRECTORY [--min-time SECONDS] [--runs N] [--print]
 
 gnuplot draws the picture (Debian package gnuplot-nox).
 
-With --print the figures go to standard output, and no file is written. Nothing is written unless every
-benchmark ran and every answer was right. A limit that can be kept, and was missed, is a failure.
+With --print, the figures are printed, and no file is written. Nothing is written unless all benchmarks
+ran and all responses were right. A limit that can be kept, and was missed, is a failure.
 """
 
 import argparse
@@ -24,10 +24,10 @@ INSTRUCTIONS = HERE / "instructions.json"
 PLOTTED = ("Load", "EnumInstances", "EnumInstanceNames", "GetInstance.middle", "ModifyInstance")
 PLOTTED_CLASS = "VELKO_Lease"
 HEAD = "<!-- Written by script/benchmark. -->\n\n# Performance figures\n\n"
-SIDES = ("provider", "floor")
-# Loading is timed by itself, all else with the floor in turn.
+SIDES = ("provider", "baseline")
+# Loading is timed separately; all other requests alternate with the baseline.
 TIMED = "^Load/|/both/|/gate/"
-# What is to take no longer a record in the largest table: what it is called, the operation, what bounds it.
+# Operations whose time per record is limited in the largest table: name, operation, what bounds it.
 LARGEST = (("Enumerating leases", "EnumInstances", "the object manager's instances"),
            ("Enumerating their names", "EnumInstanceNames", "the object manager's paths"),
            ("Loading leases", "Load", "reading the file"),
@@ -35,7 +35,7 @@ LARGEST = (("Enumerating leases", "EnumInstances", "the object manager's instanc
 
 
 def run(program, min_time):
-    """The result of the benchmark program as Google Benchmark's JSON."""
+    """The result of the benchmark program, as JSON of Google Benchmark."""
     command = [program, "--benchmark_format=json", f"--benchmark_min_time={min_time}", f"--benchmark_filter={TIMED}"]
     done = subprocess.run(command, stdout=subprocess.PIPE, text=True, check=False)
     if done.returncode != 0:
@@ -44,9 +44,9 @@ def run(program, min_time):
 
 
 def measured(results):
-    """{(operation, class): {size: {side: nanoseconds}}}, in the order of the program; of several runs the best time.
+    """{(operation, class): {size: {side: nanoseconds}}}, in the order of the program; of several runs, the best time.
 
-    Where the gate was measured, the sides "alone" and "gated" are the two that were measured in turn.
+    The sides of a measurement of the gate are "alone" and "gated".
     """
     cases = {}
     units = {"ns": 1, "us": 1e3, "ms": 1e6, "s": 1e9}
@@ -62,7 +62,7 @@ def measured(results):
     for case, sizes in cases.items():
         for size, times in sizes.items():
             if not set(SIDES) <= set(times):
-                sys.exit(f"{case} with {size} records has not both sides")
+                sys.exit(f"{case} with {size} records does not have both sides")
     return cases
 
 
@@ -74,7 +74,7 @@ def time_text(nanoseconds):
 
 
 def ratio_text(times):
-    ratio = times["provider"] / times["floor"]
+    ratio = times["provider"] / times["baseline"]
     return f"{ratio:.1f}" if ratio < 99.95 else f"{ratio:,.0f}"
 
 
@@ -85,14 +85,14 @@ def table(head, rows):
 
 
 def counts_of(operation, class_name, size):
-    """The kept instructions of both sides; nothing where they are not counted."""
+    """The stored instructions of both sides; nothing if they are not counted."""
     kept = json.loads(INSTRUCTIONS.read_text(encoding="utf-8"))
     names = [f"{operation}/{class_name}/{side}/{size}" for side in SIDES]
     return [kept[name] for name in names] if names[0] in kept else []
 
 
 def requests_table(cases):
-    """One row a request, class and size: times, and instructions where they are counted."""
+    """One row per request, class and size: times, and instructions if they are counted."""
     rows = []
     for (operation, class_name), by_size in cases.items():
         for size, times in sorted(by_size.items()):
@@ -100,12 +100,12 @@ def requests_table(cases):
             own = [f"{(counts[0] - counts[1]) / size:,.0f}" if counts else ""]
             rows.append([operation, class_name, f"{size:,}", *(time_text(times[side]) for side in SIDES),
                          ratio_text(times), *([f"{count:,}" for count in counts] or ["", ""]), *own])
-    return table(["Request", "Class", "Records", "Provider", "Floor", "Ratio", "Instructions", "of the floor",
+    return table(["Request", "Class", "Records", "Provider", "Baseline", "Ratio", "Instructions", "of the baseline",
                   "own, per record"], rows)
 
 
 def gate_table(cases):
-    """What the gate adds, one row a case and size that was measured with it."""
+    """What the gate adds, one row per case and size."""
     rows = []
     for (operation, class_name), by_size in cases.items():
         for size, times in sorted(by_size.items()):
@@ -117,15 +117,15 @@ def gate_table(cases):
 
 
 def growth_cells(by_size, side):
-    """Time a record in both tables, and its growth; nothing where a difference is lost in what it is taken from."""
-    times = [time_a_record(by_size, side, size) for size in (10000, 1000000)]
-    if min(times) < 0.05 * time_a_record(by_size, "provider", 10000):
+    """Time per record in both tables, and its growth; nothing if the difference of two times is too small."""
+    times = [time_per_record(by_size, side, size) for size in (10000, 1000000)]
+    if min(times) < 0.05 * time_per_record(by_size, "provider", 10000):
         return ["", "", ""]
     return [*map(time_text, times), f"{growth(by_size, side):.2f}"]
 
 
 def growth_table(cases):
-    """Time a record with the largest table over that with 10,000 records."""
+    """Time per record in the largest table, relative to 10,000 records."""
     rows = []
     for (operation, class_name), by_size in cases.items():
         largest = max(by_size)
@@ -133,12 +133,12 @@ def growth_table(cases):
             cells = [cell for side in (*SIDES, "own") for cell in growth_cells(by_size, side)]
             rows.append([operation, class_name, *cells])
     head = ["with 10,000", "with 1,000,000", "growth"]
-    return table(["Request", "Class", *head, f"floor: {head[0]}", *head[1:], f"provider's own: {head[0]}", *head[1:]],
+    return table(["Request", "Class", *head, f"baseline: {head[0]}", *head[1:], f"provider's own: {head[0]}", *head[1:]],
                  rows)
 
 
 def memories(results):
-    """(class, size, counters) of each loading of a table that is large enough to have pages of its own."""
+    """(class, size, counters) of each loading of a table that is large enough to be mapped separately."""
     for one in results[-1]["benchmarks"]:
         operation, class_name, side, size = one["name"].split("/")[:4]
         if (operation, side) == ("Load", "provider") and int(size) >= 10000:
@@ -146,10 +146,10 @@ def memories(results):
 
 
 def memory_table(results):
-    """The table has room for more records than there are; the pages of that room are not in use."""
+    """The table reserves memory for more records; the pages of that memory are not resident."""
     rows = []
     for class_name, size, one in memories(results):
-        memory, text, pieces = one["bytes_per_record"], one["text_per_record"], one["pieces_per_record"]
+        memory, text, pieces = one["bytes_per_record"], one["file_per_record"], one["pieces_per_record"]
         record = memory - pieces
         cells = (text, memory, record, pieces, one["table_per_record"] - record)
         rows.append([class_name, f"{size:,}", *(f"{cell:.0f}" for cell in cells), f"{memory / text:.2f}"])
@@ -157,19 +157,19 @@ def memory_table(results):
                   "of that its strings", "also reserved", "Ratio of memory to file"], rows)
 
 
-def time_a_record(by_size, side, size):
-    """Nanoseconds; of the side "own" what the provider takes besides the floor."""
+def time_per_record(by_size, side, size):
+    """Nanoseconds; of the side "own", the provider's without the baseline's."""
     times = by_size[size]
-    return (times["provider"] - times["floor"] if side == "own" else times[side]) / size
+    return (times["provider"] - times["baseline"] if side == "own" else times[side]) / size
 
 
 def growth(by_size, side="provider"):
-    """Time a record of 1,000,000 over that of 10,000."""
-    return time_a_record(by_size, side, 1000000) / time_a_record(by_size, side, 10000)
+    """Time per record with 1,000,000 records, relative to 10,000."""
+    return time_per_record(by_size, side, 1000000) / time_per_record(by_size, side, 10000)
 
 
 class Limit:
-    """What the provider or the gate is to keep to, what was measured, and whether it is in their hands."""
+    """A limit of the provider or the gate, and the measured figure."""
 
     def __init__(self, what, measured_here, at_most, bound, is_reachable=True):
         self.what, self.measured, self.at_most, self.bound = what, measured_here, at_most, bound
@@ -185,14 +185,14 @@ def limits_of(cases, results):
     added = leases["GetInstance.middle"][10]["gated"] - leases["GetInstance.middle"][10]["alone"]
     counted = json.loads(INSTRUCTIONS.read_text(encoding="utf-8"))
     counted_part = counted["EnumInstances/VELKO_Lease/gate/1000"] / counted["EnumInstances/VELKO_Lease/provider/1000"]
-    limits = [Limit("Enumerating 1,000 leases, relative to the floor", enumeration["provider"] / enumeration["floor"], 3,
-                    "the broker calls, which the floor makes too"),
+    limits = [Limit("Enumerating 1,000 leases, relative to the baseline", enumeration["provider"] / enumeration["baseline"], 3,
+                    "the broker calls, which the baseline makes too"),
               Limit("Getting one of 10,000 leases, nanoseconds per record", max(scans), 100, "one walk over the table")]
     limits += [Limit(f"{what}: time per record with 1,000,000, relative to 10,000", growth(leases[operation]), 1.5,
-                     f"{bound}; the floor: {growth(leases[operation], 'floor'):.2f}")
+                     f"{bound}; the baseline: {growth(leases[operation], 'baseline'):.2f}")
                for what, operation, bound in LARGEST]
     limits += [Limit(f"Memory of {class_name} among 10,000, relative to its size in the file",
-                     one["bytes_per_record"] / one["text_per_record"], 2,
+                     one["bytes_per_record"] / one["file_per_record"], 2,
                      "the record layout, and one allocation per longer string", False)
                for class_name, size, one in memories(results) if size == 10000]
     limits += [Limit("Gate, enumerating 1,000 leases: added time in percent", 100 * gated, 5,
@@ -210,7 +210,7 @@ def limits_table(limits):
 
 
 def draw(cases):
-    """Draws the time a record of some requests, provider and floor, over the number of records."""
+    """Draws the time per record of some requests, provider and baseline, over the number of records."""
     columns = [cases[(operation, PLOTTED_CLASS)] for operation in PLOTTED]
     lines = []
     for size in sorted({size for by_size in columns for size in by_size}):
@@ -256,10 +256,10 @@ def main():
     parser = argparse.ArgumentParser(description="Runs the benchmarks and reports their figures.")
     parser.add_argument("build_directory", type=pathlib.Path)
     parser.add_argument("--min-time", type=float, default=0.1, metavar="SECONDS",
-                        help="how long each benchmark runs at least")
+                        help="shortest time of each benchmark")
     parser.add_argument("--runs", type=int, default=1, metavar="N",
-                        help="how often everything is run; the best time of each is kept")
-    parser.add_argument("--print", action="store_true", help="leave the document alone")
+                        help="number of runs; the best time of each is used")
+    parser.add_argument("--print", action="store_true", help="print the figures and write no file")
     arguments = parser.parse_args()
     program = arguments.build_directory / "bin" / "provider_benchmark"
     results = [run(program, arguments.min_time) for _ in range(arguments.runs)]

@@ -102,7 +102,7 @@ bool isInterval(std::string_view string) {
     return isDateTime(string) && string[21] == ':' && string.find('*') == std::string_view::npos;
 }
 
-std::string formatPointInTime(std::int64_t seconds, int offset) {
+std::string formatPointInTime(std::int64_t seconds, int offset, int microseconds) {
     std::int64_t shifted = 0;
     if (offset < -999 || offset > 999 || __builtin_add_overflow(seconds, offset * 60, &shifted)) {
         return {};
@@ -114,8 +114,8 @@ std::string formatPointInTime(std::int64_t seconds, int offset) {
     }
     char string[80];
     const int length =
-        std::snprintf(string, sizeof string, "%04d%02d%02d%02d%02d%02d.000000%c%03d", fields.tm_year + 1900,
-                      fields.tm_mon + 1, fields.tm_mday, fields.tm_hour, fields.tm_min, fields.tm_sec,
+        std::snprintf(string, sizeof string, "%04d%02d%02d%02d%02d%02d.%06d%c%03d", fields.tm_year + 1900,
+                      fields.tm_mon + 1, fields.tm_mday, fields.tm_hour, fields.tm_min, fields.tm_sec, microseconds,
                       offset < 0 ? '-' : '+', offset < 0 ? -offset : offset);
     return {string, static_cast<std::size_t>(length)};
 }

@@ -27,10 +27,11 @@ bool isInterval(std::string_view string);
 
 /**
  * Formats a point in time as CIM datetime.
- * @param seconds since 1970-01-01 00:00 UTC
- * @param offset  minutes from UTC of the local time to format
+ * @param seconds      since 1970-01-01 00:00 UTC
+ * @param offset       minutes from UTC of the local time to format
+ * @param microseconds from 0 to 999999, added to the seconds
  * @return empty if the year is not in 0 to 9999 or the offset exceeds 999 minutes
  */
-std::string formatPointInTime(std::int64_t seconds, int offset);
+std::string formatPointInTime(std::int64_t seconds, int offset, int microseconds = 0);
 
 }  // namespace cim

@@ -38,6 +38,30 @@ inline std::size_t findInvalidUtf8(std::string_view string) {
     return byte == string.end() ? std::string_view::npos : static_cast<std::size_t>(byte - string.begin());
 }
 
+/** Length of the invalid bytes at the front of a string: a truncated character, or one byte. */
+inline std::size_t invalidLength(std::string_view string) {
+    for (const std::size_t length : {3U, 2U}) {
+        // A prefix of a character is one that continuation bytes complete.
+        const std::string completed = std::string(string.substr(0, length)) + "\x80\x80";
+        if (string.size() >= length && firstCharacter(completed).valid) {
+            return length;
+        }
+    }
+    return 1;
+}
+
+/** Replaces each truncated character and each other byte that is not part of a character by U+FFFD. */
+inline std::string replaceInvalidUtf8(std::string_view string) {
+    std::string replaced;
+    while (!string.empty()) {
+        const Utf8Character character = firstCharacter(string);
+        const std::size_t length = character.valid ? character.length : invalidLength(string);
+        replaced += character.valid ? string.substr(0, length) : "\uFFFD";
+        string.remove_prefix(length);
+    }
+    return replaced;
+}
+
 /** Whether a number can be encoded in UTF-8: not a surrogate, and not above U+10FFFF. */
 inline bool isCodePoint(std::uint32_t number) {
     return number <= 0x10FFFF && (number < 0xD800 || number > 0xDFFF);

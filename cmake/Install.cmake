@@ -11,23 +11,32 @@ set(LAW_FRAMEWORK_INTERFACE 1)
 find_program(LAW_GZIP gzip REQUIRED)
 mark_as_advanced(LAW_GZIP)
 
-# Libraries outside of the dynamic linker's default directories are found relative to the libraries that need them.
-set(from_provider_directory "$ORIGIN")
-set(from_library_directory "")
+# Libraries outside of the dynamic linker's default directories are found relative to the libraries that need them. In the
+# build tree, all libraries are in one directory.
 if(NOT CMAKE_INSTALL_FULL_LIBDIR IN_LIST CMAKE_CXX_IMPLICIT_LINK_DIRECTORIES)
-    list(APPEND from_provider_directory "$ORIGIN/..")
+    set(from_provider_directory "$ORIGIN" "$ORIGIN/..")
     set(from_library_directory "$ORIGIN")
 endif()
+
+# law_run_path(<target> [<directory>...])
+# A library in the build tree has the run path of the installed one: CMake would pad another one with empty elements, and
+# these mean the current directory.
+function(law_run_path target)
+    set_target_properties(${target} PROPERTIES INSTALL_RPATH "${ARGN}")
+    if(ARGN)
+        set_target_properties(${target} PROPERTIES BUILD_WITH_INSTALL_RPATH ON)
+    endif()
+endfunction()
 
 # law_install_provider(<target> COMPONENT <component> [BESIDE_OTHERS])
 # Installs a library that object managers load. BESIDE_OTHERS: it needs another library in that directory.
 function(law_install_provider target)
     cmake_parse_arguments(arg "BESIDE_OTHERS" "COMPONENT" "" ${ARGN})
-    set(search ${from_provider_directory})
-    if(NOT arg_BESIDE_OTHERS)
-        list(REMOVE_ITEM search "$ORIGIN")
+    set(directories ${from_provider_directory})
+    if(arg_BESIDE_OTHERS AND NOT directories)
+        set(directories "$ORIGIN")
     endif()
-    set_target_properties(${target} PROPERTIES BUILD_RPATH_USE_ORIGIN ON INSTALL_RPATH "${search}")
+    law_run_path(${target} ${directories})
     install(TARGETS ${target} LIBRARY DESTINATION ${LAW_PROVIDER_DIRECTORY} COMPONENT ${arg_COMPONENT})
 endfunction()
 
@@ -36,8 +45,8 @@ endfunction()
 function(law_install_library target)
     cmake_parse_arguments(arg "" "COMPONENT" "" ${ARGN})
     set_target_properties(${target} PROPERTIES
-        SOVERSION ${LAW_FRAMEWORK_INTERFACE} VERSION ${LAW_FRAMEWORK_INTERFACE}.0.0
-        INSTALL_RPATH "${from_library_directory}")
+        SOVERSION ${LAW_FRAMEWORK_INTERFACE} VERSION ${LAW_FRAMEWORK_INTERFACE}.0.0)
+    law_run_path(${target} ${from_library_directory})
     install(TARGETS ${target} EXPORT ${LAW_EXPORT}
         LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR} COMPONENT ${arg_COMPONENT}
         NAMELINK_COMPONENT development)

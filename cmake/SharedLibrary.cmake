@@ -2,15 +2,21 @@
 include(CheckCXXCompilerFlag)
 check_cxx_compiler_flag(-fno-gnu-unique LAW_HAVE_NO_GNU_UNIQUE)
 
-# law_shared_library(<target> [EXPORTS <version script>])
-# Sets the options of a library that an object manager loads: it has no undefined symbols, exports only the symbols of
-# the version script, and can be unloaded.
-function(law_shared_library target)
-    cmake_parse_arguments(arg "" "EXPORTS" "" ${ARGN})
-    target_link_libraries(${target} PRIVATE law_options)
+# law_unloadable(<target>)
+# Sets the options of the objects of a library that object managers load and unload.
+function(law_unloadable target)
     if(LAW_HAVE_NO_GNU_UNIQUE)
         target_compile_options(${target} PRIVATE -fno-gnu-unique)
     endif()
+endfunction()
+
+# law_shared_library(<target> [EXPORTS <version script>])
+# Options of a library that object managers load and unload: no undefined symbols, and no exports except those of the
+# version script.
+function(law_shared_library target)
+    cmake_parse_arguments(arg "" "EXPORTS" "" ${ARGN})
+    target_link_libraries(${target} PRIVATE law_options)
+    law_unloadable(${target})
     if(NOT LAW_SANITIZE)
         target_link_options(${target} PRIVATE -Wl,-z,defs)
     endif()

@@ -1,6 +1,6 @@
 #include "support/AgentEnvironment.h"
 
-// The agent that the provider works with in a fuzzer.
+// The agent of the fuzzers of providers.
 
 const char* const agentNodes = agentEnvironment::oneComputer;
 extern const bool agentHasNoLog = true;

@@ -6,7 +6,7 @@
 #include <limits>
 #include <string>
 
-// The agent's configuration file: nothing is thrown, and every setting is in its range, be it configured or default.
+// The agent's configuration file: parsing does not throw, and all settings, configured or default, are in their ranges.
 
 namespace {
 
@@ -23,24 +23,24 @@ void requireRanges(const KO::AgentSettings& settings) {
     requireDirectory(settings.dataDirectory);
     requireDirectory(settings.dmiRoot);
     const auto& product = settings.product;
-    for (const std::string* text :
+    for (const std::string* value :
          {&product.name, &product.version, &product.buildNumber, &product.identifyingNumber, &product.vendor}) {
-        require(!text->empty(), "every text of the product is there");
+        require(!value->empty(), "the product has all its values");
     }
     for (const KO::Node& node : settings.nodes) {
         require(node.type <= 0xFFFF && !node.path.empty(), "a node has a type and a path");
-        for (const auto& [number, text] : node.properties) {
+        for (const auto& [number, value] : node.properties) {
             require(number <= 0xFFFF, "a property has a number");
         }
     }
     for (const auto& [name, flag] : settings.flags) {
-        require(name == "gate.refuse_lossy_values", "a switch is one that there is");
+        require(name == "gate.refuse_lossy_values", "a switch is a known one");
     }
 }
 
 void requireRanges(const LogSettings& settings) {
     const bool isFile = settings.destination == LogSettings::Destination::file;
-    require(isFile != settings.file.empty(), "a log file has a path, and nothing else has");
+    require(isFile != settings.file.empty(), "a log has a path if it is a file");
     require(!isFile || (settings.file.front() == '/' && settings.file.find('\0') == std::string::npos),
             "a log file's path is absolute");
     require(settings.rotationSize >= 4096 && settings.rotationSize <= std::numeric_limits<int>::max(),
@@ -53,10 +53,10 @@ void requireRanges(const LogSettings& settings) {
     }
 }
 
-/** What is read of a configuration, and what is found wrong with it. */
+/** The settings and problems of a configuration. */
 struct Reading {
-    explicit Reading(std::string_view text)
-        : document(Agent::Document::parse(text, "agent.toml")),
+    explicit Reading(std::string_view content)
+        : document(Agent::Document::parse(content, "agent.toml")),
           agent(KO::readAgentSettings(document, problems)),
           log(RZLog::readLogSettings(document, problems)) {}
 
@@ -69,11 +69,11 @@ struct Reading {
 }  // namespace
 
 int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-    const Reading reading(fuzz::textOf(data, size));
+    const Reading reading(fuzz::inputOf(data, size));
     requireRanges(reading.agent);
     requireRanges(reading.log);
     for (const std::string& problem : reading.problems) {
-        require(!problem.empty(), "a problem is told");
+        require(!problem.empty(), "a problem has a message");
     }
     if (!reading.document.problem().empty()) {
         const Reading defaults("");

@@ -5,16 +5,16 @@
 
 namespace fuzz {
 
-/** Takes decisions off an input, byte by byte; zeros when it is used up. */
+/** Derives decisions from the bytes of an input; from zeros after its end. */
 class Bytes {
 public:
     Bytes(const std::uint8_t* data, std::size_t size) : next(data), end(data + size) {}
 
-    bool isUsedUp() const { return next == end; }
+    bool isAtEnd() const { return next == end; }
 
-    std::uint8_t byte() { return isUsedUp() ? std::uint8_t{0} : *next++; }
+    std::uint8_t byte() { return isAtEnd() ? std::uint8_t{0} : *next++; }
 
-    /** A number below the limit, which is not above 256. */
+    /** A number below the limit. @param limit at most 256 */
     std::size_t below(std::size_t limit) { return byte() % limit; }
 
     /** One of the elements. */

@@ -13,28 +13,41 @@ namespace fuzz {
 namespace {
 
 using cimhost::NamedValue;
+using cimhost::Operation;
 using cimhost::Value;
 using Names = std::vector<const char*>;
 
-/** The more often it stands here, the more often it is picked. */
-constexpr std::array actions{Action::createInstance,     Action::createInstance,  Action::createInstance,
-                             Action::modifyInstance,     Action::modifyInstance,  Action::modifyInstance,
-                             Action::deleteInstance,     Action::deleteInstance,  Action::getInstance,
-                             Action::enumerateInstances, Action::restart,         Action::enumerateInstanceNames,
-                             Action::associators,        Action::associatorNames, Action::references,
-                             Action::referenceNames,     Action::execQuery,       Action::cleanup,
-                             Action::associationCleanup};
+using Action = std::variant<Operation, Event>;
 
-const char* nameOf(Action action) {
-    switch (action) {
-        case Action::cleanup:
+/** Actions that are listed more often are chosen more often. */
+constexpr std::array<Action, 19> actions{Operation::createInstance,
+                                         Operation::createInstance,
+                                         Operation::createInstance,
+                                         Operation::modifyInstance,
+                                         Operation::modifyInstance,
+                                         Operation::modifyInstance,
+                                         Operation::deleteInstance,
+                                         Operation::deleteInstance,
+                                         Operation::getInstance,
+                                         Operation::enumerateInstances,
+                                         Event::restart,
+                                         Operation::enumerateInstanceNames,
+                                         Operation::associators,
+                                         Operation::associatorNames,
+                                         Operation::references,
+                                         Operation::referenceNames,
+                                         Operation::execQuery,
+                                         Event::cleanup,
+                                         Event::associationCleanup};
+
+const char* nameOf(Event event) {
+    switch (event) {
+        case Event::cleanup:
             return "cleanup";
-        case Action::associationCleanup:
+        case Event::associationCleanup:
             return "associationCleanup";
-        case Action::restart:
-            return "restart";
         default:
-            return cimhost::nameOf(static_cast<cimhost::Operation>(action));
+            return "restart";
     }
 }
 
@@ -93,7 +106,7 @@ const Names properties{"Lessor",
                        "lessor",
                        "Unknown"};
 
-const std::vector<std::string>& texts() {
+const std::vector<std::string>& strings() {
     static const std::vector<std::string> all{"A",
                                               "B",
                                               "lease 1",
@@ -123,10 +136,10 @@ const std::vector<std::string>& texts() {
     return all;
 }
 
-/** A text that can be stored. */
-std::string aptText(Bytes& bytes) {
-    constexpr std::size_t aptTexts = 5;
-    return texts()[bytes.below(aptTexts)];
+/** A string that can be stored. */
+std::string validString(Bytes& bytes) {
+    constexpr std::size_t validStrings = 5;
+    return strings()[bytes.below(validStrings)];
 }
 
 /** A string object without characters, which some object managers pass to providers. */
@@ -167,17 +180,17 @@ Value nextValue(Bytes& bytes) {
         case 9:
             return testsupport::reference({"", bytes.pick(nameSpaces), bytes.pick(classes), {}});
         case 10:
-            return Value::array(CMPI_string, {nextText(bytes)});
+            return Value::array(CMPI_string, {nextString(bytes)});
         case 11:
             return testsupport::real64(1.5);
         default:
-            return testsupport::text(nextText(bytes));
+            return testsupport::text(nextString(bytes));
     }
 }
 
-/** Mostly a text. */
+/** Usually a string. */
 Value nextKeyValue(Bytes& bytes) {
-    return bytes.below(8) == 0 ? nextValue(bytes) : testsupport::text(nextText(bytes));
+    return bytes.below(8) == 0 ? nextValue(bytes) : testsupport::text(nextString(bytes));
 }
 
 /** A property that can be modified. */
@@ -204,7 +217,7 @@ constexpr Writable writables[] = {{"VELKO_Lease", "Lessor", CMPI_string},
                                   {"VELKO_AssetIDDetails", "PurchaseDate", CMPI_dateTime},
                                   {"VELKO_AssetIDDetails", "SystemLocation", CMPI_string}};
 
-Value aptValue(Bytes& bytes, CMPIType type) {
+Value validValue(Bytes& bytes, CMPIType type) {
     switch (type) {
         case CMPI_uint32:
             return testsupport::uint32(number(bytes));
@@ -213,11 +226,11 @@ Value aptValue(Bytes& bytes, CMPIType type) {
         case CMPI_dateTime:
             return testsupport::dateTime(date(bytes));
         default:
-            return testsupport::text(aptText(bytes));
+            return testsupport::text(validString(bytes));
     }
 }
 
-/** Some of a class's properties that can be modified. */
+/** Some of the properties of a class that can be modified. */
 std::vector<const Writable*> someWritables(Bytes& bytes, const std::string& className) {
     const std::size_t low = bytes.byte();
     const std::size_t chosen = low | std::size_t{bytes.byte()} << 8U;
@@ -230,24 +243,26 @@ std::vector<const Writable*> someWritables(Bytes& bytes, const std::string& clas
     return some;
 }
 
-void makeApt(Call& call, Bytes& bytes) {
-    call.isApt = true;
-    constexpr std::array apt{"VELKO_Lease", "VELKO_Lease", "VELKO_Warranty", "VELKO_AssetIDDetails"};
-    call.path = {"", "root/cimv2", bytes.pick(apt), {{"InstanceID", testsupport::text(aptText(bytes))}}};
-    if (call.path.className == apt.back()) {
-        call.path.keys = {{"IdentifyingNumber", testsupport::text("/system")},
-                          {"Name", testsupport::text("testhost")},
-                          {"Vendor", testsupport::text("Example Maker")},
-                          {"Version", testsupport::text("4.2.0")}};
+void makeValid(Call& call, Bytes& bytes) {
+    cimhost::Request& request = call.request;
+    call.isValid = true;
+    call.hasInstance = true;
+    constexpr std::array classNames{"VELKO_Lease", "VELKO_Lease", "VELKO_Warranty", "VELKO_AssetIDDetails"};
+    request.path = {"", "root/cimv2", bytes.pick(classNames), {{"InstanceID", testsupport::text(validString(bytes))}}};
+    if (request.path.className == classNames.back()) {
+        request.path.keys = {{"IdentifyingNumber", testsupport::text("/system")},
+                             {"Name", testsupport::text("testhost")},
+                             {"Vendor", testsupport::text("Example Maker")},
+                             {"Version", testsupport::text("4.2.0")}};
     }
-    call.instance = cimhost::Instance{call.path, {}};
-    for (const Writable* each : someWritables(bytes, call.path.className)) {
-        call.instance->properties.push_back({each->name, aptValue(bytes, each->type)});
+    request.instance = {request.path, {}};
+    for (const Writable* each : someWritables(bytes, request.path.className)) {
+        request.instance.properties.push_back({each->name, validValue(bytes, each->type)});
     }
     if (bytes.below(4) == 0) {
-        for (const Writable* each : someWritables(bytes, call.path.className)) {
-            call.properties = call.properties.value_or(std::vector<std::string>{});
-            call.properties->emplace_back(each->name);
+        for (const Writable* each : someWritables(bytes, request.path.className)) {
+            request.properties = request.properties.value_or(std::vector<std::string>{});
+            request.properties->emplace_back(each->name);
         }
     }
 }
@@ -262,17 +277,18 @@ cimhost::ObjectPath nextPath(Bytes& bytes) {
     return path;
 }
 
-std::optional<cimhost::Instance> nextInstance(Bytes& bytes, const cimhost::ObjectPath& path) {
+void addInstance(Call& call, Bytes& bytes) {
     const std::size_t count = bytes.below(9);
-    if (count == 8) {
-        return std::nullopt;
+    call.hasInstance = count != 8;
+    if (!call.hasInstance) {
+        return;
     }
-    cimhost::Instance instance{path, {}};
+    cimhost::Instance& instance = call.request.instance;
+    instance.path = call.request.path;
     for (std::size_t property = 0; property < count; ++property) {
         std::string name = bytes.pick(properties);
         instance.properties.push_back({std::move(name), nextValue(bytes)});
     }
-    return instance;
 }
 
 cimhost::PropertyList nextProperties(Bytes& bytes) {
@@ -306,61 +322,60 @@ std::optional<std::string> nextAssociation(Bytes& bytes) {
 
 }  // namespace
 
-std::string nextText(Bytes& bytes) {
+std::string nextString(Bytes& bytes) {
     const std::size_t choice = bytes.byte();
     if (choice < 16 * 8) {
-        return texts()[choice % texts().size()];
+        return strings()[choice % strings().size()];
     }
-    std::string text;
-    for (std::size_t left = choice % 16; left > 0 && !bytes.isUsedUp(); --left) {
+    std::string string;
+    for (std::size_t left = choice % 16; left > 0 && !bytes.isAtEnd(); --left) {
         const auto byte = static_cast<char>(bytes.byte());
-        text += byte == '\0' ? ' ' : byte;
+        string += byte == '\0' ? ' ' : byte;
     }
-    return text;
+    return string;
 }
 
-std::string toText(const Call& call) {
-    std::string text = nameOf(call.action);
-    text += " " + cimhost::formatObjectPath(call.path) + "\n";
-    for (const std::string& name : call.properties.value_or(std::vector<std::string>{})) {
-        text += "  listed: " + name + "\n";
+std::string describe(const Call& call) {
+    if (call.event) {
+        return std::string(nameOf(*call.event)) + "\n";
     }
-    for (const auto* name :
-         {&call.filter.associationClass, &call.filter.resultClass, &call.filter.role, &call.filter.resultRole}) {
-        text += *name ? "  filter: " + **name + "\n" : "";
+    const cimhost::Request& request = call.request;
+    std::string description =
+        std::string(cimhost::nameOf(request.operation)) + " " + cimhost::formatObjectPath(request.path) + "\n";
+    for (const std::string& name : request.properties.value_or(std::vector<std::string>{})) {
+        description += "  listed: " + name + "\n";
     }
-    return text + (call.instance ? cimhost::formatMof(*call.instance) : "");
+    for (const auto* name : {&request.filter.associationClass, &request.filter.resultClass, &request.filter.role,
+                             &request.filter.resultRole}) {
+        description += *name ? "  filter: " + **name + "\n" : "";
+    }
+    return description + (call.hasInstance ? cimhost::formatMof(request.instance) : "");
 }
 
 Call nextCall(Bytes& bytes) {
-    Call call{bytes.pick(actions)};
-    if (call.action <= Action::deleteInstance && bytes.below(2) == 1) {
-        makeApt(call, bytes);
+    Call call;
+    const Action& action = bytes.pick(actions);
+    if (const auto* event = std::get_if<Event>(&action)) {
+        call.event = *event;
+    } else {
+        call.request.operation = std::get<Operation>(action);
+    }
+    if (!call.event && call.request.operation <= Operation::deleteInstance && bytes.below(2) == 1) {
+        makeValid(call, bytes);
         return call;
     }
-    call.path = nextPath(bytes);
-    switch (call.action) {
-        case Action::createInstance:
-        case Action::modifyInstance:
-            call.instance = nextInstance(bytes, call.path);
-            call.properties = nextProperties(bytes);
-            break;
-        case Action::enumerateInstances:
-        case Action::getInstance:
-            call.properties = nextProperties(bytes);
-            break;
-        case Action::associators:
-        case Action::associatorNames:
-        case Action::references:
-        case Action::referenceNames:
-            call.filter.associationClass = nextAssociation(bytes);
-            call.filter.resultClass = nextName(bytes);
-            call.filter.role = nextName(bytes);
-            call.filter.resultRole = nextName(bytes);
-            call.properties = nextProperties(bytes);
-            break;
-        default:
-            break;
+    call.request.path = nextPath(bytes);
+    if (call.performs(Operation::createInstance) || call.performs(Operation::modifyInstance)) {
+        addInstance(call, bytes);
+        call.request.properties = nextProperties(bytes);
+    } else if (call.performs(Operation::enumerateInstances) || call.performs(Operation::getInstance)) {
+        call.request.properties = nextProperties(bytes);
+    } else if (!call.event && cimhost::isAssociationOperation(call.request.operation)) {
+        call.request.filter.associationClass = nextAssociation(bytes);
+        call.request.filter.resultClass = nextName(bytes);
+        call.request.filter.role = nextName(bytes);
+        call.request.filter.resultRole = nextName(bytes);
+        call.request.properties = nextProperties(bytes);
     }
     return call;
 }

@@ -1,52 +1,46 @@
 #pragma once
 
-#include "Bytes.h"
+#include <optional>
+#include <string>
+#include <variant>
 
+#include "Bytes.h"
 #include "model/Request.h"
 #include "model/Value.h"
 
-#include <optional>
-#include <string>
-
-// Requests as an input describes them.
+// Calls of a provider, described by an input.
 
 namespace fuzz {
 
-/** An operation, with the number that cimhost::Operation gives it, or something else that is done to a provider. */
-enum class Action {
-    enumerateInstances,
-    enumerateInstanceNames,
-    getInstance,
-    createInstance,
-    modifyInstance,
-    deleteInstance,
-    execQuery,
-    associators,
-    associatorNames,
-    references,
-    referenceNames,
-    cleanup,
+/** Something other than a request that happens to a provider. */
+enum class Event {
+    cleanup,  ///< of the instance interface
     associationCleanup,
     restart,  ///< the library is unloaded and loaded again
 };
 
-/** A call with its arguments, of which it uses those that its action has; a null pointer where there is none. */
+/** A request to a provider, or an event. */
 struct Call {
-    Action action;
-    cimhost::ObjectPath path{};
-    cimhost::PropertyList properties{};
-    std::optional<cimhost::Instance> instance{};
-    cimhost::AssociationFilter filter{};
-    bool isApt = false;  ///< can well succeed: has a class that keeps something, all of its keys, and values that fit
+    std::optional<Event> event{};  ///< none: the request
+    cimhost::Request request{};
+    bool hasInstance = false;  ///< false: the instance of a creation or modification is a null pointer
+    bool isValid = false;      ///< whether the class can be changed, the path has all keys, and the values match types
+
+    bool performs(cimhost::Operation operation) const { return !event && request.operation == operation; }
+    bool isRead() const { return !event && request.operation <= cimhost::Operation::getInstance; }
+    bool isChange() const {
+        return !event && request.operation >= cimhost::Operation::createInstance &&
+               request.operation <= cimhost::Operation::deleteInstance;
+    }
 };
 
-/** The call as people read it. */
-std::string toText(const Call& call);
+/** Describes a call for people. */
+std::string describe(const Call& call);
 
 /** The next call that the input describes. */
 Call nextCall(Bytes& bytes);
 
-/** A text: mostly one that means something somewhere, else any bytes but 0. */
-std::string nextText(Bytes& bytes);
+/** A string: usually one with a meaning in some place, otherwise any bytes except 0. */
+std::string nextString(Bytes& bytes);
 
 }  // namespace fuzz

@@ -8,11 +8,11 @@
 
 #include "support/Files.h"
 
-// Takes a fuzzer's kept inputs through it, built as the other tests are and without the fuzzing engine.
+// Runs a fuzzer with the inputs of its corpus, without the fuzzing engine.
 
 namespace {
 
-std::vector<std::filesystem::path> keptInputs() {
+std::vector<std::filesystem::path> corpus() {
     std::vector<std::filesystem::path> files;
     for (const auto& entry : std::filesystem::directory_iterator(FUZZ_CORPUS)) {
         files.push_back(entry.path());
@@ -21,7 +21,7 @@ std::vector<std::filesystem::path> keptInputs() {
     return files;
 }
 
-void tryInput(const std::string& input) {
+void check(const std::string& input) {
     try {
         LLVMFuzzerTestOneInput(reinterpret_cast<const std::uint8_t*>(input.data()), input.size());
     } catch (const std::exception& violation) {
@@ -30,14 +30,14 @@ void tryInput(const std::string& input) {
 }
 
 TEST(FuzzCorpusTest, FUZZ_NAME) {
-    const auto files = keptInputs();
+    const auto files = corpus();
     ASSERT_FALSE(files.empty()) << FUZZ_CORPUS;
     for (const auto& file : files) {
         SCOPED_TRACE(file.filename());
-        tryInput(testsupport::readFile(file));
+        check(testsupport::readFile(file));
     }
     SCOPED_TRACE("empty input");
-    tryInput({});
+    check({});
 }
 
 }  // namespace

@@ -1,10 +1,11 @@
 #include "ProviderModel.h"
 #include "Target.h"
 
+#include "cim/DateTime.h"
+#include "cim/Names.h"
 #include "framework/PropertyText.h"
 #include "model/Request.h"
 #include "schema/MofWriter.h"
-#include "schema/Names.h"
 #include "support/AssetModel.h"
 #include "support/Values.h"
 
@@ -13,8 +14,8 @@
 #include <map>
 #include <string>
 
-// Sequences of calls through the gate's function tables: what is answered OK was done as the standard says and
-// survives a restart, what is answered otherwise has a message and has changed nothing.
+// Sequences of calls of the gate's function tables: a call that returns OK has the effect that CIM defines, and
+// survives a restart; any other call has a message and changes nothing.
 
 extern "C" {
 CMPIInstanceMI* LeaseAndWarrantyGate_Create_InstanceMI(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
@@ -30,7 +31,7 @@ fuzz::Interfaces fuzz::openInterfaces(const CMPIBroker* broker) {
 namespace {
 
 using namespace fuzz;
-using cimhost::sameName;
+using cimhost::Operation;
 using testsupport::AssetField;
 using testsupport::AssetKind;
 using testsupport::Form;
@@ -43,29 +44,30 @@ constexpr std::size_t mostCalls = 30;
 constexpr const char* identifierName = "InstanceID";
 
 bool isListed(const Call& call, const char* property) {
-    return !call.properties || std::any_of(call.properties->begin(), call.properties->end(),
-                                           [&](const std::string& each) { return sameName(each, property); });
+    return !call.request.properties ||
+           std::any_of(call.request.properties->begin(), call.request.properties->end(),
+                       [&](const std::string& each) { return cim::sameName(each, property); });
 }
 
-/** A value that a client gives for a field; none where it gives none. */
+/** The value that a client sends for a field; none if it does not. */
 std::optional<std::string> given(const Call& call, const testsupport::ModelField& field) {
     switch (field.form) {
         case Form::number:
-            return givenNumber(*call.instance, field.property);
+            return givenNumber(call.request.instance, field.property);
         case Form::flag:
-            return givenFlag(*call.instance, field.property);
+            return givenFlag(call.request.instance, field.property);
         default:
-            return givenText(*call.instance, field.property);
+            return givenString(call.request.instance, field.property);
     }
 }
 
-/** What clients see of a value of the asset file. */
-std::string shownOf(const AssetField& field, const std::string& kept) {
-    const bool isEmpty = field.kind == AssetKind::personalized && kept == "Null";  // the provider's word for it
-    return isEmpty ? std::string() : kept;
+/** The value that clients receive for a value of the asset file. */
+std::string shownOf(const AssetField& field, const std::string& stored) {
+    const bool isEmpty = field.kind == AssetKind::personalized && stored == "Null";  // the provider's empty value
+    return isEmpty ? std::string() : stored;
 }
 
-/** The values of asset data, by the file's key; absent ones are empty. */
+/** The asset data by key of the file; absent values are empty. */
 AssetValues assetValues() {
     const KO::PropertyText properties(dataFile("asset.dat").value_or(""));
     AssetValues values;
@@ -75,71 +77,70 @@ AssetValues assetValues() {
     return values;
 }
 
-/** A text without what an object manager may take off its ends: blanks, or also what is outside of ASCII. */
-std::string trimmed(const std::string& text, bool alsoOutsideAscii) {
+/** Removes the characters from both ends that an object manager may remove: blanks, and possibly non-ASCII bytes. */
+std::string trimmed(const std::string& value, bool alsoOutsideAscii) {
     const auto stays = [&](unsigned char each) { return each > ' ' && !(alsoOutsideAscii && each > 0x7F); };
-    const auto begin = std::find_if(text.begin(), text.end(), stays);
-    const auto end = std::find_if(text.rbegin(), std::make_reverse_iterator(begin), stays).base();
+    const auto begin = std::find_if(value.begin(), value.end(), stays);
+    const auto end = std::find_if(value.rbegin(), std::make_reverse_iterator(begin), stays).base();
     return {begin, end};
 }
 
-/** Whether a given text is the one that is there, as it comes back to the gate, and no change. */
-bool isSentBack(const Call& call, const std::string& text, const std::string& there) {
-    return !there.empty() &&
-           (trimmed(there, false) == text || (!call.properties.has_value() && trimmed(there, true) == text));
+/** Whether a sent value is the stored one, as the client received it, and therefore not a change. */
+bool isSentBack(const Call& call, const std::string& value, const std::string& stored) {
+    return !stored.empty() && (trimmed(stored, false) == value ||
+                               (!call.request.properties.has_value() && trimmed(stored, true) == value));
 }
 
-/** The records of a store. That there is no date is kept in two ways, of which clients see one. */
+/** The records of a store. There are two representations of no date, which clients cannot distinguish. */
 Records recordsOf(const Store& store) {
     Records records = store.records();
     for (ModelRecord& record : records) {
         for (std::size_t index = 0; index < record.size(); ++index) {
-            const bool isNoDate =
-                store.fields()[index].form == Form::date && record[index] == "00000000000000.000000-000";
+            const bool isNoDate = store.fields()[index].form == Form::date && record[index] == cim::noDate;
             record[index] = isNoDate ? "" : record[index];
         }
     }
     return records;
 }
 
-/** All that is kept, before and after a call. */
-struct Kept {
+/** All stored data, before or after a call. */
+struct Snapshot {
     Records leases = recordsOf(leaseStore());
     Records warranties = recordsOf(warrantyStore());
     AssetValues asset = assetValues();
 
     const Records& of(const Store& store) const { return &store == &leaseStore() ? leases : warranties; }
 
-    bool operator==(const Kept& other) const {
+    bool operator==(const Snapshot& other) const {
         return leases == other.leases && warranties == other.warranties && asset == other.asset;
     }
 };
 
-/** Whether what an apt call gives comes back: in records no text of one character does, in asset data no interval. */
-bool canBeKept(const Call& call, bool isRecord) {
-    const auto& values = call.instance->properties;
+/** Whether the values of a valid call can be stored: records lose strings of one character, asset data intervals. */
+bool canBeStored(const Call& call, bool isRecord) {
+    const auto& values = call.request.instance.properties;
     return std::all_of(values.begin(), values.end(), [&](const cimhost::NamedValue& each) {
-        const auto text = givenText(*call.instance, each.name.c_str());
-        return !text || (isRecord ? text->size() > 1 : text->find(':') == std::string::npos);
+        const auto value = givenString(call.request.instance, each.name.c_str());
+        return !value || (isRecord ? value->size() > 1 : value->find(':') == std::string::npos);
     });
 }
 
-/** Whether nothing stands in the way of a call: what it is for is there, or not yet, and its values can be kept. */
-bool mustSucceed(const Call& call, const Kept& before) {
-    const Store* store = storeOf(call.path.className);
-    const bool isCreation = call.action == Action::createInstance;
-    const bool givesValues = isCreation || call.action == Action::modifyInstance;
-    if (!call.isApt || (givesValues && !canBeKept(call, store != nullptr))) {
+/** Whether a call must succeed: its instance exists, or does not exist yet, and its values can be stored. */
+bool mustSucceed(const Call& call, const Snapshot& before) {
+    const Store* store = storeOf(call.request.path.className);
+    const bool isCreation = call.performs(Operation::createInstance);
+    const bool hasValues = isCreation || call.performs(Operation::modifyInstance);
+    if (!call.isValid || (hasValues && !canBeStored(call, store != nullptr))) {
         return false;
     }
     if (store == nullptr) {
-        return !isCreation && call.action != Action::deleteInstance;
+        return !isCreation && !call.performs(Operation::deleteInstance);
     }
     const Records& records = before.of(*store);
-    const bool isThere = std::any_of(records.begin(), records.end(), [&](const ModelRecord& record) {
-        return record.front() == keyText(call.path, identifierName);
+    const bool exists = std::any_of(records.begin(), records.end(), [&](const ModelRecord& record) {
+        return record.front() == keyString(call.request.path, identifierName);
     });
-    return call.action <= Action::enumerateInstanceNames || isThere != isCreation;
+    return call.request.operation <= Operation::enumerateInstanceNames || exists != isCreation;
 }
 
 void requireFileHolds(const Store& store, const Records& records) {
@@ -149,89 +150,86 @@ void requireFileHolds(const Store& store, const Records& records) {
     requireSame<std::size_t>(store.count(), records.size(), "count of records");
 }
 
-/** The gate over the provider, and what is kept behind it. */
-class Trial {
+/** A sequence of calls of the gate. */
+class TestCase {
 public:
-    explicit Trial(Bytes& bytes) : subject(bytes.byte()) {}
+    explicit TestCase(Bytes& bytes) : gate(bytes.byte()) {}
 
-    void make(const Call& call) {
-        const Kept before;
-        const cimhost::ProviderResponse answer = subject.make(call);
+    void perform(const Call& call) {
+        const Snapshot before;
+        const cimhost::ProviderResponse response = gate.perform(call);
         try {
-            requireRight(call, answer, before);
+            requireRight(call, response, before);
         } catch (const Violation& violation) {
-            throw Violation(violation.what() + ("\nafter " + toText(call)) + answer.status.message);
+            throw Violation(violation.what() + ("\nafter " + describe(call)) + response.status.message);
         }
     }
 
 private:
-    static void requireRight(const Call& call, const cimhost::ProviderResponse& answer, const Kept& before) {
-        const Kept after;
-        require(!answer.threw, "no exception leaves the gate: " + answer.status.message);
-        require(answer.hasMessage == (answer.status.rc != CMPI_RC_OK), "a status but OK has a message");
-        require(answer.doneCount() <= 1, "an answer is ended once at most");
-        if (answer.status.rc != CMPI_RC_OK) {
-            require(answer.events.empty(), "a failure gives no part of an answer");
-            require(!mustSucceed(call, before), "what can be done is done");
+    static void requireRight(const Call& call, const cimhost::ProviderResponse& response, const Snapshot& before) {
+        const Snapshot after;
+        require(!response.threw, "the gate does not throw: " + response.status.message);
+        require(response.hasMessage == (response.status.rc != CMPI_RC_OK), "only a status other than OK has a message");
+        require(response.doneCount() <= 1, "returnDone is called at most once");
+        if (response.status.rc != CMPI_RC_OK) {
+            require(response.events.empty(), "a failure has no results");
+            require(!mustSucceed(call, before), "a valid request succeeds");
         }
-        if (answer.status.rc == CMPI_RC_OK && isChange(call.action)) {
-            requireChange(call, answer, before, after);
+        if (response.status.rc == CMPI_RC_OK && call.isChange()) {
+            requireChange(call, response, before, after);
         } else {
-            require(before == after, "only a change that was answered OK changes anything");
+            require(before == after, "only a change that returns OK changes data");
         }
-        requireReading(call, answer, after);
+        requireReading(call, response, after);
         requireFileHolds(leaseStore(), after.leases);
         requireFileHolds(warrantyStore(), after.warranties);
     }
 
-    static bool isChange(Action action) {
-        return action == Action::createInstance || action == Action::modifyInstance || action == Action::deleteInstance;
-    }
-
-    static void requireChange(const Call& call, const cimhost::ProviderResponse& answer, const Kept& before,
-                              const Kept& after) {
-        const Store* store = storeOf(call.path.className);
+    static void requireChange(const Call& call, const cimhost::ProviderResponse& response, const Snapshot& before,
+                              const Snapshot& after) {
+        const Store* store = storeOf(call.request.path.className);
         if (store == nullptr) {
-            require(sameName(call.path.className, "VELKO_AssetIDDetails"), "only some classes can be changed");
-            require(before.leases == after.leases && before.warranties == after.warranties, "records stay");
+            require(cim::sameName(call.request.path.className, "VELKO_AssetIDDetails"),
+                    "only some classes can be changed");
+            require(before.leases == after.leases && before.warranties == after.warranties, "records are unchanged");
             return requireAsset(call, before.asset, after.asset);
         }
         const Store& other = store == &leaseStore() ? warrantyStore() : leaseStore();
-        require(before.of(other) == after.of(other) && before.asset == after.asset, "other classes stay");
-        if (call.action == Action::createInstance) {
-            requireCreated(*store, call, answer, before.of(*store), after.of(*store));
-        } else if (call.action == Action::modifyInstance) {
+        require(before.of(other) == after.of(other) && before.asset == after.asset, "other classes are unchanged");
+        if (call.performs(Operation::createInstance)) {
+            requireCreated(*store, call, response, before.of(*store), after.of(*store));
+        } else if (call.performs(Operation::modifyInstance)) {
             requireModified(*store, call, before.of(*store), after.of(*store));
         } else {
             requireRemoved(call, before.of(*store), after.of(*store));
         }
     }
 
-    static void requireCreated(const Store& store, const Call& call, const cimhost::ProviderResponse& answer,
+    static void requireCreated(const Store& store, const Call& call, const cimhost::ProviderResponse& response,
                                Records expected, const Records& after) {
-        const auto paths = cimhost::eventsOf<cimhost::ObjectPath>(answer.events);
-        require(paths.size() == 1 && answer.doneCount() == 1, "a creation answers a path");
-        const auto identifier = keyText(paths.front(), identifierName);
+        const auto paths = cimhost::eventsOf<cimhost::ObjectPath>(response.events);
+        require(paths.size() == 1 && response.doneCount() == 1, "a creation returns a path");
+        const auto identifier = keyString(paths.front(), identifierName);
         require(identifier && !identifier->empty(), "a new record has an identifier");
-        require(
-            keyText(call.path, identifierName).value_or("").empty() || keyText(call.path, identifierName) == identifier,
-            "the identifier is the path's");
+        require(keyString(call.request.path, identifierName).value_or("").empty() ||
+                    keyString(call.request.path, identifierName) == identifier,
+                "the identifier is the path's");
         RecordModel model(store.fields());
         model.records = std::move(expected);
         require(model.find(*identifier) == nullptr, "what is there already is not created");
         ModelRecord record = model.newRecord(*identifier);
         applyGiven(model, call, record, false);
         model.records.push_back(std::move(record));
-        require(after == model.records, "the new record, with its values, is all that is new");
+        require(after == model.records, "the new record, with its values, is the only change");
     }
 
     static void requireModified(const Store& store, const Call& call, Records expected, const Records& after) {
         RecordModel model(store.fields());
         model.records = std::move(expected);
-        ModelRecord* record = model.find(keyText(call.path, identifierName).value_or(""));
-        require(record != nullptr, "what is changed is there");
+        ModelRecord* record = model.find(keyString(call.request.path, identifierName).value_or(""));
+        require(record != nullptr, "the modified record exists");
         applyGiven(model, call, *record, true);
-        require(after == model.records, "the record has the values that were given, and nothing else is changed");
+        require(after == model.records, "the record has the sent values, and nothing else is changed");
     }
 
     static void applyGiven(const RecordModel& model, const Call& call, ModelRecord& record, bool byList) {
@@ -245,50 +243,50 @@ private:
     }
 
     static void requireRemoved(const Call& call, Records expected, const Records& after) {
-        const auto identifier = keyText(call.path, identifierName);
+        const auto identifier = keyString(call.request.path, identifierName);
         const auto found = std::find_if(expected.begin(), expected.end(),
                                         [&](const ModelRecord& record) { return record.front() == identifier; });
-        require(found != expected.end(), "what is deleted was there");
+        require(found != expected.end(), "the deleted record existed");
         expected.erase(found);
-        require(after == expected, "the record, and nothing else, is deleted");
+        require(after == expected, "only the record is deleted");
     }
 
     static void requireAsset(const Call& call, const AssetValues& before, const AssetValues& after) {
-        require(call.action == Action::modifyInstance, "asset data can only be modified");
+        require(call.performs(Operation::modifyInstance), "asset data can only be modified");
         for (const AssetField& field : testsupport::assetFields) {
-            const std::string& there = before.at(field.key);
-            const auto value = givenText(*call.instance, field.property);
+            const std::string& stored = before.at(field.key);
+            const auto value = givenString(call.request.instance, field.property);
             const bool isChange = value && field.kind != AssetKind::readOnly && isListed(call, field.property) &&
-                                  !isSentBack(call, *value, there);
-            requireSame(after.at(field.key), isChange ? shownOf(field, field.kept(*value)) : there, field.key);
+                                  !isSentBack(call, *value, stored);
+            requireSame(after.at(field.key), isChange ? shownOf(field, field.kept(*value)) : stored, field.key);
         }
     }
 
-    /** Enumerations and gets of records give what there is. */
-    static void requireReading(const Call& call, const cimhost::ProviderResponse& answer, const Kept& kept) {
-        const Store* store = storeOf(call.path.className);
-        if (store == nullptr || call.action > Action::getInstance) {
+    /** Enumerations and gets of records return the stored records. */
+    static void requireReading(const Call& call, const cimhost::ProviderResponse& response, const Snapshot& stored) {
+        const Store* store = storeOf(call.request.path.className);
+        if (store == nullptr || !call.isRead()) {
             return;
         }
         const RecordModel model(store->fields());
-        const auto identifier = keyText(call.path, identifierName);
+        const auto identifier = keyString(call.request.path, identifierName);
         std::vector<std::vector<std::string>> expected;
-        for (const ModelRecord& record : kept.of(*store)) {
-            if (call.action != Action::getInstance || record.front() == identifier) {
+        for (const ModelRecord& record : stored.of(*store)) {
+            if (!call.performs(Operation::getInstance) || record.front() == identifier) {
                 expected.push_back(shown(model, call, record));
             }
         }
-        const bool isMissing = call.action == Action::getInstance && expected.empty();
-        require((answer.status.rc == CMPI_RC_OK) == !isMissing, "what is there can be read");
-        require(shown(model, call, answer) == expected, "the answer has the instances");
+        const bool isMissing = call.performs(Operation::getInstance) && expected.empty();
+        require((response.status.rc == CMPI_RC_OK) == !isMissing, "an existing record can be read");
+        require(shown(model, call, response) == expected, "the response has the instances");
     }
 
-    /** What an answer shows of a record: the identifier, and what the property list lets through. */
+    /** The values of a record that a response must have: the identifier, and the listed properties. */
     static std::vector<std::string> shown(const RecordModel& model, const Call& call, const ModelRecord& record) {
         std::vector<std::string> values = model.shown(record);
         for (std::size_t index = 1; index < values.size(); ++index) {
             const char* name = model.fields[index].property;
-            if (call.action == Action::enumerateInstanceNames || !isListed(call, name)) {
+            if (call.performs(Operation::enumerateInstanceNames) || !isListed(call, name)) {
                 values[index] = std::string(name) + "=";
             }
         }
@@ -296,28 +294,28 @@ private:
     }
 
     static std::vector<std::vector<std::string>> shown(const RecordModel& model, const Call& call,
-                                                       const cimhost::ProviderResponse& answer) {
+                                                       const cimhost::ProviderResponse& response) {
         std::vector<std::vector<std::string>> all;
-        for (const auto& instance : cimhost::eventsOf<cimhost::Instance>(answer.events)) {
+        for (const auto& instance : cimhost::eventsOf<cimhost::Instance>(response.events)) {
             all.push_back(model.shownFields(instance));
         }
-        for (const auto& path : cimhost::eventsOf<cimhost::ObjectPath>(answer.events)) {
-            ModelRecord record = model.newRecord(keyText(path, identifierName).value_or(""));
+        for (const auto& path : cimhost::eventsOf<cimhost::ObjectPath>(response.events)) {
+            ModelRecord record = model.newRecord(keyString(path, identifierName).value_or(""));
             all.push_back(shown(model, call, record));
         }
         return all;
     }
 
-    Subject subject;
+    SystemUnderTest gate;
 };
 
 }  // namespace
 
 int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     Bytes bytes(data, size);
-    Trial trial(bytes);
-    for (std::size_t calls = 0; calls < mostCalls && !bytes.isUsedUp(); ++calls) {
-        trial.make(nextCall(bytes));
+    TestCase test(bytes);
+    for (std::size_t calls = 0; calls < mostCalls && !bytes.isAtEnd(); ++calls) {
+        test.perform(nextCall(bytes));
     }
     return 0;
 }

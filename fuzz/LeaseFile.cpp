@@ -4,5 +4,5 @@
 using KO::LeaseWarrantyProvider::LeaseStoreTraits;
 
 int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-    return fuzz::tryRecordFile<LeaseStoreTraits>(testsupport::leaseFields(), fuzz::textOf(data, size));
+    return fuzz::checkRecordFile<LeaseStoreTraits>(testsupport::leaseFields(), fuzz::inputOf(data, size));
 }

@@ -5,10 +5,10 @@
 
 namespace fuzz {
 
-/** A file that is only in memory, and yet has a path by which it can be opened, read and rewritten. */
+/** A file in memory. It has a path, with which it can be opened, read and rewritten. */
 class MemoryFile {
 public:
-    /** @throws std::system_error when the operating system has none */
+    /** @throws std::system_error if the system cannot create it */
     MemoryFile();
     ~MemoryFile();
     MemoryFile(const MemoryFile&) = delete;

@@ -10,7 +10,8 @@
 #include <string>
 #include <string_view>
 
-// MOF: a text is refused with a LoadError, or its classes hang together and its values read the same once written.
+// MOF: an input is rejected with a LoadError, or its classes are consistent and its values are read as they are
+// written.
 
 namespace {
 
@@ -21,39 +22,39 @@ using cimhost::Value;
 using fuzz::require;
 using fuzz::requireSame;
 
-bool containsIgnoringCase(std::string_view text, std::string_view word) {
-    return std::search(text.begin(), text.end(), word.begin(), word.end(), [](char left, char right) {
+bool containsIgnoringCase(std::string_view mof, std::string_view word) {
+    return std::search(mof.begin(), mof.end(), word.begin(), word.end(), [](char left, char right) {
                return std::tolower(static_cast<unsigned char>(left)) == right;
-           }) != text.end();
+           }) != mof.end();
 }
 
-/** Whether the text could include files of this machine, by a path that leads out of the folder that is looked in. */
-bool mayReadFiles(std::string_view text) {
-    return containsIgnoringCase(text, "pragma") && text.find_first_of("/\\") != std::string_view::npos;
+/** Whether the MOF could include a file outside of the directory of includes. */
+bool mayReadFiles(std::string_view mof) {
+    return containsIgnoringCase(mof, "pragma") && mof.find_first_of("/\\") != std::string_view::npos;
 }
 
-std::string upperCase(std::string text) {
-    std::transform(text.begin(), text.end(), text.begin(),
+std::string upperCase(std::string name) {
+    std::transform(name.begin(), name.end(), name.begin(),
                    [](unsigned char each) { return static_cast<char>(std::toupper(each)); });
-    return text;
+    return name;
 }
 
 void requireSound(const Schema& schema, const Class& each) {
     require(schema.findClass(upperCase(each.name)) == &each, "a class is found by its name in any letter case");
     const Class* super = schema.findClass(each.superclass);
-    require(each.superclass.empty() == (super == nullptr), "a superclass is there");
+    require(each.superclass.empty() == (super == nullptr), "the superclass exists");
     require(super == nullptr || each.properties.size() >= super->properties.size(), "properties are inherited");
-    require(super == nullptr || schema.isA(each.name, super->name), "a class is one of its superclass");
+    require(super == nullptr || schema.isA(each.name, super->name), "a class is derived from its superclass");
     for (const Property& property : each.properties) {
-        require(each.findProperty(upperCase(property.name)) == &property, "no property is there twice");
-        require(schema.isA(each.name, property.origin), "a property is declared by the class or one above it");
+        require(each.findProperty(upperCase(property.name)) == &property, "property names are unique");
+        require(schema.isA(each.name, property.origin), "a property is declared by the class or a superclass");
         require(property.type != CMPI_ref || !property.referenceClass.empty(), "a reference has a class");
     }
 }
 
 bool isSettled(const Schema& schema, const cimhost::ObjectPath& path, const std::string& referenceClass);
 
-/** Whether references in the value are read alike by now: they may be to classes that were declared only later. */
+/** Whether references in a value are read in the same way again: their classes may have been declared after them. */
 bool isSettled(const Schema& schema, const Value& value, const std::string& referenceClass) {
     return std::all_of(value.elements.begin(), value.elements.end(), [&](const cimhost::Scalar& element) {
         const auto* path = std::get_if<std::shared_ptr<const cimhost::ObjectPath>>(&element);
@@ -89,7 +90,7 @@ std::string newClassName(const Schema& schema) {
     return name;
 }
 
-/** The defaults of a class read the same once written. */
+/** Requires that the defaults of a class are read as they are written. */
 void requireSameDefaults(Schema& schema, const Class& each) {
     std::string declarations;
     for (const Property& property : each.properties) {
@@ -98,12 +99,12 @@ void requireSameDefaults(Schema& schema, const Class& each) {
         }
     }
     const std::string name = newClassName(schema);
-    cimhost::MofReader(schema).readText("class " + name + " {\n" + declarations + "};\n", "rewritten");
-    std::string again;
+    cimhost::MofReader(schema).readSource("class " + name + " {\n" + declarations + "};\n", "rewritten");
+    std::string reread;
     for (const Property& property : schema.findClass(name)->properties) {
-        again += declaration(property);
+        reread += declaration(property);
     }
-    requireSame(again, declarations, "defaults that were written and read");
+    requireSame(reread, declarations, "defaults that were written and read");
 }
 
 bool isSettled(const Schema& schema, const cimhost::Instance& instance) {
@@ -113,14 +114,14 @@ bool isSettled(const Schema& schema, const cimhost::Instance& instance) {
     });
 }
 
-/** The instances read the same once written. */
+/** Requires that the instances are read as they are written. */
 void requireSameInstances(Schema& schema) {
     const std::vector<cimhost::Instance> instances = schema.instances();
     for (const cimhost::Instance& instance : instances) {
         if (isSettled(schema, instance)) {
-            const std::string text = cimhost::formatMof(instance);
-            cimhost::MofReader(schema).readText(text, "rewritten");
-            requireSame(cimhost::formatMof(schema.instances().back()), text, "instance that was written and read");
+            const std::string mof = cimhost::formatMof(instance);
+            cimhost::MofReader(schema).readSource(mof, "rewritten");
+            requireSame(cimhost::formatMof(schema.instances().back()), mof, "instance that was written and read");
         }
     }
 }
@@ -128,15 +129,15 @@ void requireSameInstances(Schema& schema) {
 }  // namespace
 
 int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-    const std::string_view text = fuzz::textOf(data, size);
-    if (mayReadFiles(text)) {
+    const std::string_view mof = fuzz::inputOf(data, size);
+    if (mayReadFiles(mof)) {
         return -1;
     }
     Schema schema;
     try {
-        cimhost::MofReader(schema).readText(text, "input", "/nonexistent");
+        cimhost::MofReader(schema).readSource(mof, "input", "/nonexistent");
     } catch (const cimhost::LoadError& error) {
-        require(std::string(error.what()).rfind("input:", 0) == 0, "an error begins with where it is");
+        require(std::string(error.what()).rfind("input:", 0) == 0, "an error begins with its position");
     }
     for (const Class* each : schema.classes()) {
         requireSound(schema, *each);

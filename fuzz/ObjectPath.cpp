@@ -2,13 +2,13 @@
 
 #include "Target.h"
 
+#include "cim/Names.h"
 #include "schema/Errors.h"
 #include "schema/MofReader.h"
-#include "schema/Names.h"
 
 #include <string>
 
-// Object paths: a text is refused with a PathError, or its path's text is one from which the same path is read.
+// Object paths: an input is rejected with a PathError, or its path is read as it is written.
 
 namespace {
 
@@ -17,7 +17,7 @@ using fuzz::requireSame;
 
 constexpr const char* nameSpace = "root/cimv2";
 
-/** Classes with a key of every type, and the classes of the provider's kind. */
+/** Classes with keys of every type, and an association. */
 constexpr const char* classes = R"(
 class Every {
     [Key] boolean Flag; [Key] char16 Character; [Key] string Text; [Key] datetime Date;
@@ -34,16 +34,16 @@ class Keyless { string Plain; };
 const cimhost::Schema& schema() {
     static cimhost::Schema known;
     if (known.classes().empty()) {
-        cimhost::MofReader(known).readText(classes, "classes");
+        cimhost::MofReader(known).readSource(classes, "classes");
     }
     return known;
 }
 
 void requireSound(const cimhost::ObjectPath& path) {
-    require(cimhost::isName(path.className), "a path has a class");
+    require(cim::isName(path.className), "a path has a class");
     require(!path.nameSpace.empty(), "a path has a namespace");
     for (const cimhost::NamedValue& key : path.keys) {
-        require(cimhost::isName(key.name), "a key has a name");
+        require(cim::isName(key.name), "a key has a name");
         require(!key.value.isNull && key.value.elements.size() == 1, "a key has a value");
     }
 }
@@ -53,18 +53,18 @@ void requireSound(const cimhost::ObjectPath& path) {
 int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     cimhost::ObjectPath path;
     try {
-        path = cimhost::parseObjectPath(fuzz::textOf(data, size), schema(), nameSpace);
+        path = cimhost::parseObjectPath(fuzz::inputOf(data, size), schema(), nameSpace);
     } catch (const cimhost::PathError&) {
         return 0;
     }
     requireSound(path);
-    const std::string text = cimhost::formatObjectPath(path);
-    const cimhost::ObjectPath again = cimhost::parseObjectPath(text, schema(), "root/other");
-    requireSound(again);
-    requireSame(cimhost::formatObjectPath(again), text, "path that was written and read");
-    requireSame(again.keys.size(), path.keys.size(), "keys of a path that was written and read");
+    const std::string uri = cimhost::formatObjectPath(path);
+    const cimhost::ObjectPath reread = cimhost::parseObjectPath(uri, schema(), "root/other");
+    requireSound(reread);
+    requireSame(cimhost::formatObjectPath(reread), uri, "path that was written and read");
+    requireSame(reread.keys.size(), path.keys.size(), "keys of a path that was written and read");
     for (std::size_t key = 0; key < path.keys.size(); ++key) {
-        require(again.keys[key].value.type == path.keys[key].value.type, "a key has the type that it had");
+        require(reread.keys[key].value.type == path.keys[key].value.type, "a key keeps its type");
     }
     return 0;
 }

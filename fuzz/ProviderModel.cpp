@@ -2,8 +2,8 @@
 
 #include "Target.h"
 
+#include "cim/Names.h"
 #include "framework/PropertyText.h"
-#include "schema/Names.h"
 #include "support/AssetModel.h"
 
 #include <algorithm>
@@ -22,11 +22,11 @@ using testsupport::ModelRecord;
 
 const Value* valueNamed(const std::vector<NamedValue>& values, const char* name) {
     const auto found = std::find_if(values.begin(), values.end(),
-                                    [&](const NamedValue& each) { return cimhost::sameName(each.name, name); });
+                                    [&](const NamedValue& each) { return cim::sameName(each.name, name); });
     return found == values.end() ? nullptr : &found->value;
 }
 
-/** The one element of a value that is there and no array. */
+/** The element of a value that is neither null nor an array; null for others. */
 const cimhost::Scalar* scalarOf(const std::vector<NamedValue>& values, const char* name) {
     const Value* value = valueNamed(values, name);
     return value == nullptr || value->isNull || value->isArray ? nullptr : &value->elements.front();
@@ -55,27 +55,27 @@ constexpr AssetKey assetPath[] = {
 
 bool isAssetPath(const cimhost::ObjectPath& path) {
     return std::all_of(std::begin(assetPath), std::end(assetPath),
-                       [&](const AssetKey& key) { return keyText(path, key.name).value_or(key.value) == key.value; });
+                       [&](const AssetKey& key) { return keyString(path, key.name).value_or(key.value) == key.value; });
 }
 
 }  // namespace
 
-std::optional<std::string> keyText(const cimhost::ObjectPath& path, const char* name) {
+std::optional<std::string> keyString(const cimhost::ObjectPath& path, const char* name) {
     const auto* scalar = scalarOf(path.keys, name);
-    const auto* text = scalar == nullptr ? nullptr : std::get_if<std::string>(scalar);
-    return text == nullptr ? std::nullopt : std::optional<std::string>(*text);
+    const auto* string = scalar == nullptr ? nullptr : std::get_if<std::string>(scalar);
+    return string == nullptr ? std::nullopt : std::optional<std::string>(*string);
 }
 
-std::optional<std::string> givenText(const Instance& instance, const char* name) {
+std::optional<std::string> givenString(const Instance& instance, const char* name) {
     const auto* scalar = scalarOf(instance.properties, name);
     if (scalar == nullptr) {
         return std::nullopt;
     }
     if (const auto* date = std::get_if<cimhost::DateTime>(scalar)) {
-        return date->text;
+        return date->value;
     }
-    const auto* text = std::get_if<std::string>(scalar);
-    return text == nullptr ? std::nullopt : std::optional<std::string>(*text);
+    const auto* string = std::get_if<std::string>(scalar);
+    return string == nullptr ? std::nullopt : std::optional<std::string>(*string);
 }
 
 std::optional<std::string> givenNumber(const Instance& instance, const char* name) {
@@ -89,9 +89,9 @@ std::optional<std::string> givenFlag(const Instance& instance, const char* name)
     return flag == nullptr ? std::nullopt : std::optional<std::string>(*flag ? "1" : "0");
 }
 
-/** A path whose key cannot be read stands for all records. */
-std::vector<ModelRecord*> RecordSide::selected(const cimhost::ObjectPath& path) {
-    const auto identifier = keyText(path, "InstanceID");
+/** Without a key that can be read, a path selects all records. */
+std::vector<ModelRecord*> ExpectedRecords::selected(const cimhost::ObjectPath& path) {
+    const auto identifier = keyString(path, "InstanceID");
     std::vector<ModelRecord*> found;
     for (ModelRecord& record : model.records) {
         if (!identifier || record.front() == *identifier) {
@@ -101,28 +101,28 @@ std::vector<ModelRecord*> RecordSide::selected(const cimhost::ObjectPath& path) 
     return found;
 }
 
-void RecordSide::write() {
+void ExpectedRecords::write() {
     file = model.written();
 }
 
-Expectation RecordSide::apply(const Call& call) {
-    switch (call.action) {
-        case Action::createInstance:
+Expectation ExpectedRecords::apply(const Call& call) {
+    switch (call.request.operation) {
+        case cimhost::Operation::createInstance:
             return create(call);
-        case Action::modifyInstance:
+        case cimhost::Operation::modifyInstance:
             return modify(call);
-        case Action::deleteInstance:
+        case cimhost::Operation::deleteInstance:
             return remove(call);
         default:
             return read(call);
     }
 }
 
-Expectation RecordSide::read(const Call& call) {
+Expectation ExpectedRecords::read(const Call& call) {
     Expectation expected{CMPI_RC_OK, 1};
-    for (const ModelRecord* record : selected(call.path)) {
+    for (const ModelRecord* record : selected(call.request.path)) {
         auto shown = model.shown(*record);
-        if (call.action == Action::enumerateInstanceNames) {
+        if (call.performs(cimhost::Operation::enumerateInstanceNames)) {
             shown.resize(1);
         }
         expected.shown.push_back(std::move(shown));
@@ -130,9 +130,9 @@ Expectation RecordSide::read(const Call& call) {
     return expected;
 }
 
-/** Only the path's key counts. What exists breaks the answer off. */
-Expectation RecordSide::create(const Call& call) {
-    const auto identifier = keyText(call.path, "InstanceID");
+/** Only the key of the path is used. If the record exists, the provider returns nothing, not even Done. */
+Expectation ExpectedRecords::create(const Call& call) {
+    const auto identifier = keyString(call.request.path, "InstanceID");
     if (!identifier) {
         return {CMPI_RC_OK, 1};
     }
@@ -144,11 +144,11 @@ Expectation RecordSide::create(const Call& call) {
     return {CMPI_RC_OK, 1, true, {model.shown(model.records.back())}};
 }
 
-bool RecordSide::change(ModelRecord& record, const Instance& instance) const {
+bool ExpectedRecords::change(ModelRecord& record, const Instance& instance) const {
     bool isChanged = false;
     for (std::size_t index = 1; index < model.fields.size(); ++index) {
         const testsupport::ModelField& field = model.fields[index];
-        const auto take = field.form == Form::number ? givenNumber : field.form == Form::flag ? givenFlag : givenText;
+        const auto take = field.form == Form::number ? givenNumber : field.form == Form::flag ? givenFlag : givenString;
         if (const auto value = take(instance, field.property)) {
             record[index] = *value;
             isChanged = true;
@@ -157,45 +157,46 @@ bool RecordSide::change(ModelRecord& record, const Instance& instance) const {
     return isChanged;
 }
 
-/** The first record that the path selects is changed, and nothing is answered. */
-Expectation RecordSide::modify(const Call& call) {
-    const auto targets = selected(call.path);
-    if (call.instance && !targets.empty() && change(*targets.front(), *call.instance)) {
+/** Changes the first selected record and returns nothing. */
+Expectation ExpectedRecords::modify(const Call& call) {
+    const auto targets = selected(call.request.path);
+    if (call.hasInstance && !targets.empty() && change(*targets.front(), call.request.instance)) {
         write();
     }
     return {};
 }
 
-/** Without a key that can be read nothing is deleted. */
-Expectation RecordSide::remove(const Call& call) {
-    const auto identifier = keyText(call.path, "InstanceID");
+/** Without a key that can be read, nothing is deleted. */
+Expectation ExpectedRecords::remove(const Call& call) {
+    const auto identifier = keyString(call.request.path, "InstanceID");
     if (identifier && model.remove(*identifier)) {
         write();
     }
     return {};
 }
 
-void RecordSide::restart() {
+void ExpectedRecords::restart() {
     model.read(file.value_or(""));
 }
 
-void RecordSide::replaceFile(const std::string& content) {
+void ExpectedRecords::replaceFile(const std::string& content) {
     writeDataFile(store.fileName, content);
     file = content;
 }
 
-void RecordSide::requireAgreement() const {
-    require(dataFile(store.fileName) == file, std::string(store.fileName) + " is as it was written last\nfound:\n" +
+void ExpectedRecords::requireAgreement() const {
+    require(dataFile(store.fileName) == file, std::string(store.fileName) + " has the expected content\nfound:\n" +
                                                   dataFile(store.fileName).value_or("(none)") + "\nexpected:\n" +
                                                   file.value_or("(none)"));
-    require(store.records() == model.records, std::string(store.className) + ": the table has the records");
-    require(store.count() == model.records.size(), std::string(store.className) + ": the count is the records'");
+    require(store.records() == model.records, std::string(store.className) + ": the table has the expected records");
+    require(store.count() == model.records.size(),
+            std::string(store.className) + ": the count is the number of records");
 }
 
-void AssetSide::modify(const Instance& instance) {
-    std::string before;  // the personalized value before, which the next repeats where it is not given
+void ExpectedAsset::modify(const Instance& instance) {
+    std::string before;  // the preceding personalized value, which the provider repeats if the next is not given
     for (const testsupport::AssetField& field : testsupport::assetFields) {
-        const auto given = givenText(instance, field.property);
+        const auto given = givenString(instance, field.property);
         if (field.kind == AssetKind::personalized) {
             before = given.value_or(field.isFirst() ? std::string() : before);
             values[field.key] = before;
@@ -207,23 +208,24 @@ void AssetSide::modify(const Instance& instance) {
     }
 }
 
-/** Every request that comes so far makes the file; a modification does not look whether the path selects anything. */
-Expectation AssetSide::apply(const Call& call) {
+/** All requests create the file. A modification does not check the path. */
+Expectation ExpectedAsset::apply(const Call& call) {
     exists = true;
-    if (call.action == Action::modifyInstance) {
-        if (call.instance) {
-            modify(*call.instance);
+    if (call.performs(cimhost::Operation::modifyInstance)) {
+        if (call.hasInstance) {
+            modify(call.request.instance);
         }
         return {};
     }
     Expectation expected{CMPI_RC_OK, 1};
-    if (isAssetPath(call.path)) {
-        expected.shown.push_back(call.action == Action::enumerateInstanceNames ? std::vector<std::string>() : shown());
+    if (isAssetPath(call.request.path)) {
+        expected.shown.push_back(call.performs(cimhost::Operation::enumerateInstanceNames) ? std::vector<std::string>()
+                                                                                           : shown());
     }
     return expected;
 }
 
-std::vector<std::string> AssetSide::shown() const {
+std::vector<std::string> ExpectedAsset::shown() const {
     std::vector<std::string> all;
     for (const testsupport::AssetField& field : testsupport::assetFields) {
         const auto value = values.find(field.key);
@@ -232,15 +234,15 @@ std::vector<std::string> AssetSide::shown() const {
     return all;
 }
 
-void AssetSide::requireAgreement() const {
+void ExpectedAsset::requireAgreement() const {
     const auto content = dataFile("asset.dat");
-    require(content.has_value() == exists, "asset.dat is there once it was asked for");
-    const KO::PropertyText found(content.value_or(""));
+    require(content.has_value() == exists, "asset.dat exists after a request");
+    const KO::PropertyText properties(content.value_or(""));
     for (const auto& [key, value] : values) {
-        requireSame(found.get(key).value_or("(none)"), value, key);
+        requireSame(properties.get(key).value_or("(none)"), value, key);
     }
-    const std::string text = content.value_or("");
-    const auto lines = static_cast<std::size_t>(std::count(text.begin(), text.end(), '\n'));
+    const std::string found = content.value_or("");
+    const auto lines = static_cast<std::size_t>(std::count(found.begin(), found.end(), '\n'));
     requireSame(lines, values.empty() ? std::size_t{0} : testsupport::assetFields.size(), "lines of asset.dat");
 }
 

@@ -1,51 +1,51 @@
 #pragma once
 
-#include "Subject.h"
+#include "SystemUnderTest.h"
 
 #include <map>
 #include <optional>
 #include <string>
 #include <vector>
 
-// What the provider must make of calls, written down a second time.
+// A model of the provider: the response to each call, and the stored data after it.
 
 namespace fuzz {
 
-/** The text of a key that the provider takes for one; none where there is no such key or its value is no text. */
-std::optional<std::string> keyText(const cimhost::ObjectPath& path, const char* name);
+/** The value of a key as the provider reads it; none if there is no such key or it is not a string. */
+std::optional<std::string> keyString(const cimhost::ObjectPath& path, const char* name);
 
-/** @name Values of properties as the provider takes them; none where there is nothing that it takes
- * A text is taken from strings and datetimes, a number from integers that fit.
+/** @name Values of properties as the provider reads them; none if it ignores them
+ * It reads strings from strings and datetimes, numbers from integers in the range of uint32.
  */
 ///@{
-std::optional<std::string> givenText(const cimhost::Instance& instance, const char* name);
+std::optional<std::string> givenString(const cimhost::Instance& instance, const char* name);
 std::optional<std::string> givenNumber(const cimhost::Instance& instance, const char* name);
 std::optional<std::string> givenFlag(const cimhost::Instance& instance, const char* name);
 ///@}
 
-/** What a call is to be answered with. */
+/** The response that a call must have. */
 struct Expectation {
     int rc = CMPI_RC_OK;
     int done = 0;
-    bool isKnown = true;                            ///< whether the following is told
-    std::vector<std::vector<std::string>> shown{};  ///< the instances, or for names the identifiers alone
+    bool isKnown = true;                            ///< whether done and shown are known
+    std::vector<std::vector<std::string>> shown{};  ///< the instances; of paths, only the identifiers
 };
 
-/** The records of a class, in memory and on disk. */
-class RecordSide {
+/** The expected records of a class, in memory and in the file. */
+class ExpectedRecords {
 public:
-    explicit RecordSide(const Store& itsStore) : store(itsStore), model(itsStore.fields()) {}
+    explicit ExpectedRecords(const Store& itsStore) : store(itsStore), model(itsStore.fields()) {}
 
-    /** Does what the call is to do, and tells how it is to be answered. */
+    /** Applies a call and returns the response that it must have. */
     Expectation apply(const Call& call);
     void restart();
 
-    /** @throws Violation unless memory and file are as they are to be */
+    /** @throws Violation if memory or file differ */
     void requireAgreement() const;
 
     std::size_t size() const { return model.records.size(); }
 
-    /** Writes the file as if somebody else did. */
+    /** Writes the file as another program would. */
     void replaceFile(const std::string& content);
 
 private:
@@ -62,8 +62,8 @@ private:
     std::optional<std::string> file{};
 };
 
-/** The asset data, which are only on disk. */
-class AssetSide {
+/** The expected asset data, which are only in the file. */
+class ExpectedAsset {
 public:
     Expectation apply(const Call& call);
     void requireAgreement() const;
@@ -73,7 +73,7 @@ private:
     std::vector<std::string> shown() const;
 
     bool exists = false;
-    std::map<std::string, std::string> values{};  ///< by the file's key
+    std::map<std::string, std::string> values{};  ///< by key of the file
 };
 
 }  // namespace fuzz

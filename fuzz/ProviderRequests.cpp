@@ -2,17 +2,17 @@
 #include "Target.h"
 
 #include "LeaseAndWarrantyProvider.h"
+#include "cim/Names.h"
 #include "model/Request.h"
 #include "schema/MofWriter.h"
-#include "schema/Names.h"
 #include "support/AssetModel.h"
 #include "support/Values.h"
 
 #include <algorithm>
 #include <string>
 
-// Sequences of calls through the provider's function tables: each is answered, and leaves tables and files, as a model
-// of the provider says. Associations and the agent's identity change nothing.
+// Sequences of calls of the provider's function tables: responses, tables and files are those of a model of the
+// provider. Associations and the agent's identity change nothing.
 
 fuzz::Interfaces fuzz::openInterfaces(const CMPIBroker* broker) {
     CMPIStatus status{CMPI_RC_OK, nullptr};
@@ -23,111 +23,112 @@ fuzz::Interfaces fuzz::openInterfaces(const CMPIBroker* broker) {
 namespace {
 
 using namespace fuzz;
-using cimhost::sameName;
+using cimhost::Operation;
 
 constexpr std::size_t mostCalls = 40;
 constexpr std::size_t mostRecords = 40;
 
 bool isOneOf(const std::string& name, std::initializer_list<const char*> names) {
-    return std::any_of(names.begin(), names.end(), [&](const char* each) { return sameName(each, name); });
+    return std::any_of(names.begin(), names.end(), [&](const char* each) { return cim::sameName(each, name); });
 }
 
 bool isSetting(const std::string& className) {
     return isOneOf(className, {"VELKO_LeaseSetting", "VELKO_WarrantySetting"});
 }
 
-/** What is answered without a look at records and asset data. */
+/** The response of a call that does not depend on records and asset data. */
 Expectation other(int rc) {
     return {rc, 0, rc != CMPI_RC_OK, {}};
 }
 
-/** The provider and the model of it. */
-class Trial {
+/** A sequence of calls of the provider and the model. */
+class TestCase {
 public:
-    explicit Trial(Bytes& bytes) : subject(bytes.byte()) {}
+    explicit TestCase(Bytes& bytes) : provider(bytes.byte()) {}
 
-    void make(const Call& call) {
+    void perform(const Call& call) {
         const Expectation expected = expect(call);
-        const cimhost::ProviderResponse answer = subject.make(call);
+        const cimhost::ProviderResponse response = provider.perform(call);
         try {
-            requireAnswer(call, expected, answer);
+            requireResponse(call, expected, response);
             leases.requireAgreement();
             warranties.requireAgreement();
             asset.requireAgreement();
         } catch (const Violation& violation) {
-            throw Violation(violation.what() + ("\nafter " + toText(call)));
+            throw Violation(violation.what() + ("\nafter " + describe(call)));
         }
     }
 
-    /** Files that somebody else wrote while the library was away. */
+    /** Replaces a record file while the library is unloaded. */
     void replaceFile(Bytes& bytes) {
-        RecordSide& side = bytes.below(2) == 0 ? leases : warranties;
+        ExpectedRecords& records = bytes.below(2) == 0 ? leases : warranties;
         std::string content = std::to_string(bytes.below(5)) + "\n";
         for (std::size_t word = bytes.below(32); word > 0; --word) {
-            content += nextText(bytes) + "\n";
+            content += nextString(bytes) + "\n";
         }
-        side.replaceFile(content);
-        make({Action::restart});
+        records.replaceFile(content);
+        perform({Event::restart});
     }
 
     bool isLarge() const { return std::max(leases.size(), warranties.size()) > mostRecords; }
 
 private:
     Expectation expect(const Call& call) {
-        switch (call.action) {
-            case Action::restart:
-                leases.restart();
-                warranties.restart();
-                return {};
-            case Action::cleanup:
-            case Action::associationCleanup:
-                return {};
-            case Action::execQuery:
-            case Action::references:
-            case Action::referenceNames:
+        if (call.event == Event::restart) {
+            leases.restart();
+            warranties.restart();
+        }
+        if (call.event) {
+            return {};
+        }
+        switch (call.request.operation) {
+            case Operation::execQuery:
+            case Operation::references:
+            case Operation::referenceNames:
                 return other(CMPI_RC_ERR_NOT_SUPPORTED);
-            case Action::associators:
-            case Action::associatorNames:
-                return other(isSetting(call.filter.associationClass.value_or("")) ? CMPI_RC_OK
-                                                                                  : CMPI_RC_ERR_INVALID_CLASS);
+            case Operation::associators:
+            case Operation::associatorNames:
+                return other(isSetting(call.request.filter.associationClass.value_or("")) ? CMPI_RC_OK
+                                                                                          : CMPI_RC_ERR_INVALID_CLASS);
             default:
                 return expectOfClass(call);
         }
     }
 
     Expectation expectOfClass(const Call& call) {
-        const std::string& name = call.path.className;
-        const bool isRead = call.action <= Action::getInstance;
-        if (sameName(name, "VELKO_Lease")) {
+        const std::string& name = call.request.path.className;
+        const bool isRead = call.isRead();
+        if (cim::sameName(name, "VELKO_Lease")) {
             return leases.apply(call);
         }
-        if (sameName(name, "VELKO_Warranty")) {
+        if (cim::sameName(name, "VELKO_Warranty")) {
             return warranties.apply(call);
         }
-        if (sameName(name, "VELKO_AssetIDDetails") && (isRead || call.action == Action::modifyInstance)) {
+        if (cim::sameName(name, "VELKO_AssetIDDetails") && (isRead || call.performs(Operation::modifyInstance))) {
             return asset.apply(call);
         }
-        if (isSetting(name) && call.action == Action::getInstance) {
+        if (isSetting(name) && call.performs(Operation::getInstance)) {
             return other(CMPI_RC_ERR_NOT_SUPPORTED);
         }
-        const bool isServed = isRead && (isSetting(name) || sameName(name, "VELKO_OstrelAgent"));
+        const bool isServed = isRead && (isSetting(name) || cim::sameName(name, "VELKO_OstrelAgent"));
         return other(isServed ? CMPI_RC_OK : CMPI_RC_ERR_INVALID_CLASS);
     }
 
-    void requireAnswer(const Call& call, const Expectation& expected, const cimhost::ProviderResponse& answer) const {
-        require(!answer.threw, "no exception leaves the provider: " + answer.status.message);
-        require(!answer.hasMessage, "a status has no message");
-        requireSame(answer.status.rc, expected.rc, "status");
+    void requireResponse(const Call& call, const Expectation& expected,
+                         const cimhost::ProviderResponse& response) const {
+        require(!response.threw, "the provider does not throw: " + response.status.message);
+        require(!response.hasMessage, "a status has no message");
+        requireSame(response.status.rc, expected.rc, "status");
         if (!expected.isKnown) {
-            require(answer.doneCount() <= 1, "an answer is ended once");
+            require(response.doneCount() <= 1, "returnDone is called at most once");
             return;
         }
-        requireSame(answer.doneCount(), expected.done, "how often the answer is ended");
-        const auto found = shownBy(call, answer);
-        require(found == expected.shown, "the answer has the instances" + difference(found, expected.shown));
+        requireSame(response.doneCount(), expected.done, "calls of returnDone");
+        const auto found = shownBy(call, response);
+        require(found == expected.shown, "the response has the instances" + difference(found, expected.shown));
     }
 
-    /** The first values that are not the same, for whoever looks for the reason. */
+    /** Describes the first difference. */
     static std::string difference(const std::vector<std::vector<std::string>>& found,
                                   const std::vector<std::vector<std::string>>& expected) {
         for (std::size_t index = 0; index < std::min(found.size(), expected.size()); ++index) {
@@ -140,18 +141,19 @@ private:
         return {};
     }
 
-    /** The answer in the expectation's form. */
-    std::vector<std::vector<std::string>> shownBy(const Call& call, const cimhost::ProviderResponse& answer) const {
+    /** Converts a response for the comparison with an expectation. */
+    std::vector<std::vector<std::string>> shownBy(const Call& call, const cimhost::ProviderResponse& response) const {
         std::vector<std::vector<std::string>> shown;
-        const Store* store = storeOf(call.path.className);
+        const Store* store = storeOf(call.request.path.className);
         const testsupport::RecordModel model(store == nullptr ? testsupport::ModelFields{} : store->fields());
-        for (const auto& instance : cimhost::eventsOf<cimhost::Instance>(answer.events)) {
-            require(instance.path.nameSpace == call.path.nameSpace, "an instance is in the request's namespace");
-            const bool isAsset = sameName(call.path.className, "VELKO_AssetIDDetails");
+        for (const auto& instance : cimhost::eventsOf<cimhost::Instance>(response.events)) {
+            require(instance.path.nameSpace == call.request.path.nameSpace,
+                    "an instance is in the request's namespace");
+            const bool isAsset = cim::sameName(call.request.path.className, "VELKO_AssetIDDetails");
             shown.push_back(isAsset ? testsupport::shownAsset(instance) : model.shownFields(instance));
         }
-        for (const auto& path : cimhost::eventsOf<cimhost::ObjectPath>(answer.events)) {
-            require(path.nameSpace == call.path.nameSpace, "a path is in the request's namespace");
+        for (const auto& path : cimhost::eventsOf<cimhost::ObjectPath>(response.events)) {
+            require(path.nameSpace == call.request.path.nameSpace, "a path is in the request's namespace");
             shown.emplace_back();
             for (const cimhost::NamedValue& key : store == nullptr ? std::vector<cimhost::NamedValue>{} : path.keys) {
                 shown.back().push_back(key.name + "=" + cimhost::formatMof(key.value));
@@ -160,22 +162,22 @@ private:
         return shown;
     }
 
-    Subject subject;
-    RecordSide leases{leaseStore()};
-    RecordSide warranties{warrantyStore()};
-    AssetSide asset{};
+    SystemUnderTest provider;
+    ExpectedRecords leases{leaseStore()};
+    ExpectedRecords warranties{warrantyStore()};
+    ExpectedAsset asset{};
 };
 
 }  // namespace
 
 int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     Bytes bytes(data, size);
-    Trial trial(bytes);
-    for (std::size_t calls = 0; calls < mostCalls && !bytes.isUsedUp() && !trial.isLarge(); ++calls) {
+    TestCase test(bytes);
+    for (std::size_t calls = 0; calls < mostCalls && !bytes.isAtEnd() && !test.isLarge(); ++calls) {
         if (bytes.below(16) == 0) {
-            trial.replaceFile(bytes);
+            test.replaceFile(bytes);
         } else {
-            trial.make(nextCall(bytes));
+            test.perform(nextCall(bytes));
         }
     }
     return 0;

@@ -12,15 +12,16 @@
 #include <variant>
 #include <vector>
 
-// What the fuzzers of the two record files share.
+// Shared by the fuzzers of the two record files.
 
 namespace fuzz {
 
-/** Announcements of more records are believed, and only cost time; those of so many that no memory holds them are not.
+/** Larger counts of records are skipped: reading them takes long. If they do not fit into memory, they must be
+ * rejected.
  */
 constexpr std::size_t mostRecords = 400;
 
-/** A record of the store in the model's form. */
+/** Converts a record of the store to one of the model. */
 template <class Store>
 testsupport::ModelRecord modelOf(const typename Store::Unit& unit) {
     testsupport::ModelRecord record;
@@ -38,13 +39,13 @@ testsupport::ModelRecord modelOf(const typename Store::Unit& unit) {
     return record;
 }
 
-/** A record file, read by the store and by the model. */
+/** A record file that the store and the model read. */
 template <class Store>
 class RecordFile {
 public:
     RecordFile(MemoryFile& itsFile, const testsupport::ModelFields& fields) : file(itsFile), model(fields) {}
 
-    /** Reads what the file holds, which both must read alike. */
+    /** Reads the file with both. @throws Violation if their records differ */
     void load() {
         count = 0;
         table.clear();
@@ -64,9 +65,9 @@ public:
         }
     }
 
-    /** Rewrites the file from what was read, which both must write alike. @return its content */
+    /** Writes the file with both. @return its content  @throws Violation if their content differs */
     std::string rewrite() {
-        require(KO::LeaseWarrantyProvider::writeRecords(file.path(), count, table), "the file is rewritten");
+        require(KO::LeaseWarrantyProvider::writeRecords(file.path(), count, table), "the file can be written");
         const std::string content = file.content();
         requireSame(content, model.written(), "rewritten file");
         return content;
@@ -98,12 +99,12 @@ void requireNothingIsRead(const MemoryFile& file) {
     } catch (const std::bad_alloc&) {
         isRefused = true;
     }
-    require(isRefused && count == 0 && table.empty(), "records that no memory holds are not read");
+    require(isRefused && count == 0 && table.empty(), "more records than fit into memory are rejected");
 }
 
-/** Any content is read as the rules of the format say, and a file that was written is read and rewritten the same. */
+/** Checks that any content is read as by the model, and that a file that was written is stable. */
 template <class Store>
-int tryRecordFile(const testsupport::ModelFields& fields, std::string_view input) {
+int checkRecordFile(const testsupport::ModelFields& fields, std::string_view input) {
     static MemoryFile file;
     file.fill(input);
     const std::size_t announced = testsupport::RecordModel::announcedIn(input);
@@ -117,11 +118,11 @@ int tryRecordFile(const testsupport::ModelFields& fields, std::string_view input
     RecordFile<Store> records(file, fields);
     records.load();
     const std::string first = records.rewrite();
-    // An empty identifier makes an empty line, which is passed over: the fields shift.
+    // An empty identifier is written as an empty line, which readers skip, so that the fields shift.
     const bool isStable = !records.hasEmptyIdentifier();
     records.load();
     const std::string second = records.rewrite();
-    require(!isStable || second == first, "a file that was written stays as it is");
+    require(!isStable || second == first, "a file that was written is stable");
     return 0;
 }
 

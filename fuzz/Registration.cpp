@@ -2,15 +2,15 @@
 
 #include "Target.h"
 
+#include "cim/Names.h"
 #include "schema/Errors.h"
-#include "schema/Names.h"
 
 #include <algorithm>
 #include <sstream>
 #include <string>
 #include <vector>
 
-// Registration files: what they hold is refused with a LoadError or understood, and then reads the same once written.
+// Registration files: an input is rejected with a LoadError, or its registrations are read as they are written.
 
 namespace {
 
@@ -26,49 +26,49 @@ std::string lineIfAny(const char* keyword, const std::string& value) {
 std::string written(const ProviderRegistration& registration) {
     std::string types = registration.instance ? " instance" : "";
     types += registration.association ? " association" : "";
-    std::string text = "[" + registration.className + "]\n";
-    text += lineIfAny("provider", registration.provider) + lineIfAny("location", registration.location);
-    text += lineIfAny("type", types);
+    std::string section = "[" + registration.className + "]\n";
+    section += lineIfAny("provider", registration.provider) + lineIfAny("location", registration.location);
+    section += lineIfAny("type", types);
     for (const std::string& nameSpace : registration.nameSpaces) {
-        text += lineIfAny("namespace", nameSpace);
+        section += lineIfAny("namespace", nameSpace);
     }
-    return text + lineIfAny("group", registration.group) + lineIfAny("unload", registration.unload);
+    return section + lineIfAny("group", registration.group) + lineIfAny("unload", registration.unload);
 }
 
 std::string written(const Registrations& registrations) {
-    std::string text;
+    std::string file;
     for (const ProviderRegistration& registration : registrations) {
-        text += written(registration);
+        file += written(registration);
     }
-    return text;
+    return file;
 }
 
-Registrations read(const std::string& text) {
-    std::istringstream stream(text);
+Registrations read(const std::string& file) {
+    std::istringstream stream(file);
     return cimhost::readRegistrations(stream, "input");
 }
 
 void requireComplete(const ProviderRegistration& registration) {
-    require(cimhost::isName(registration.className), "a class has a name");
+    require(cim::isName(registration.className), "a class has a name");
     require(!registration.provider.empty() && !registration.location.empty(), "a class has a provider");
     require(!registration.nameSpaces.empty(), "a class has a namespace");
-    require(registration.source.rfind("input:", 0) == 0, "a stanza knows where it stands");
+    require(registration.source.rfind("input:", 0) == 0, "a registration has its position");
 }
 
 }  // namespace
 
 int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-    const std::string text(fuzz::textOf(data, size));
+    const std::string file(fuzz::inputOf(data, size));
     Registrations registrations;
     try {
-        registrations = read(text);
+        registrations = read(file);
     } catch (const cimhost::LoadError& error) {
-        require(std::string(error.what()).rfind("input:", 0) == 0, "an error begins with where it is");
+        require(std::string(error.what()).rfind("input:", 0) == 0, "an error begins with its position");
         return 0;
     }
     std::for_each(registrations.begin(), registrations.end(), requireComplete);
-    const auto brackets = static_cast<std::size_t>(std::count(text.begin(), text.end(), '['));
-    require(registrations.size() <= brackets, "every stanza has its head");
+    const auto brackets = static_cast<std::size_t>(std::count(file.begin(), file.end(), '['));
+    require(registrations.size() <= brackets, "each registration has its head");
     const std::string first = written(registrations);
     requireSame(written(read(first)), first, "registrations that were written and read");
     return 0;

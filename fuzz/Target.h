@@ -7,28 +7,28 @@
 #include <string_view>
 
 /**
- * What every fuzzer defines: takes one input through the code and looks whether what must hold does.
- * @return 0, or -1 for an input that is not worth keeping
- * @throws fuzz::Violation when the input shows that something does not hold
+ * The function that each fuzzer defines. It runs the code with one input and checks its invariants.
+ * @return 0, or -1 for an input that is not to be added to the corpus
+ * @throws fuzz::Violation if an invariant does not hold
  */
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size);
 
 namespace fuzz {
 
-/** Something that must hold does not. Leaving the fuzzer, it ends the run and has the input kept. */
+/** An invariant does not hold. The exception ends the fuzzer, which saves the input. */
 class Violation : public std::logic_error {
 public:
     using std::logic_error::logic_error;
 };
 
-/** @throws Violation unless it holds */
+/** @throws Violation if the condition is false */
 inline void require(bool holds, const std::string& what) {
     if (!holds) {
         throw Violation(what);
     }
 }
 
-/** @throws Violation unless both are the same; both can be written to a string by +=, or compared as they are */
+/** @throws Violation if the values differ. The message contains strings and numbers. */
 template <class Value>
 void requireSame(const Value& found, const Value& expected, const std::string& what) {
     if (found == expected) {
@@ -43,8 +43,8 @@ void requireSame(const Value& found, const Value& expected, const std::string& w
     }
 }
 
-/** The input as text, which it often is. */
-inline std::string_view textOf(const std::uint8_t* data, std::size_t size) {
+/** The input as a string. */
+inline std::string_view inputOf(const std::uint8_t* data, std::size_t size) {
     return {reinterpret_cast<const char*>(data), size};
 }
 

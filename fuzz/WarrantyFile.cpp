@@ -4,5 +4,5 @@
 using KO::LeaseWarrantyProvider::WarrantyStoreTraits;
 
 int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-    return fuzz::tryRecordFile<WarrantyStoreTraits>(testsupport::warrantyFields(), fuzz::textOf(data, size));
+    return fuzz::checkRecordFile<WarrantyStoreTraits>(testsupport::warrantyFields(), fuzz::inputOf(data, size));
 }

@@ -38,11 +38,7 @@ std::mutex agentMutex;
 std::shared_ptr<const AgentState>* agent = nullptr;
 
 struct AgentOwner {
-    ~AgentOwner() {
-        const std::lock_guard<std::mutex> lock(agentMutex);
-        delete agent;
-        agent = nullptr;
-    }
+    ~AgentOwner() { forgetAgentState(); }
 } agentOwner;
 
 }  // namespace
@@ -53,6 +49,12 @@ std::shared_ptr<const AgentState> agentState() {
         agent = new std::shared_ptr<const AgentState>(readAgentState());
     }
     return *agent;
+}
+
+void forgetAgentState() {
+    const std::lock_guard<std::mutex> lock(agentMutex);
+    delete agent;
+    agent = nullptr;
 }
 
 }  // namespace KO

@@ -19,4 +19,7 @@ struct AgentState {
  */
 std::shared_ptr<const AgentState> agentState();
 
+/** Drops the state, so that the next call of agentState() reads it again. For tests with several configurations. */
+void forgetAgentState();
+
 }  // namespace KO

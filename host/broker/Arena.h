@@ -11,21 +11,20 @@
 namespace cimhost {
 
 /**
- * Owner of the encapsulated objects of one request on one thread: it frees them all when it goes. Safe to use from
- * several threads.
+ * Owns the encapsulated objects of one request on one thread, and frees them when it is destroyed. Thread-safe.
  */
 class Arena {
 public:
     /**
-     * @param itsTables function tables that its objects point to; they must outlive the arena
-     * @param forClones where clones of its objects go, which outlive a request; null for this arena itself
+     * @param itsTables function tables of its objects; must outlive the arena
+     * @param forClones receives the clones of its objects, which outlive a request; null: this arena
      */
     explicit Arena(const FunctionTables& itsTables, Arena* forClones = nullptr)
         : tables(itsTables), cloneArena(forClones == nullptr ? *this : *forClones) {}
     Arena(const Arena&) = delete;
     Arena& operator=(const Arena&) = delete;
 
-    /** A new object with that content; the handle lives as long as the arena. */
+    /** Creates an object with this content. The handle is valid for the lifetime of the arena. */
     template <class Handle>
     Handle* make(typename Traits<Handle>::Content content) {
         auto object = std::make_unique<Encapsulated<Handle>>(*this, tables, std::move(content));
@@ -34,22 +33,22 @@ public:
         return handle;
     }
 
-    /** Remembers how far the arena is filled, for releaseMark(); the answer belongs to the arena. */
+    /** Marks the current position for releaseMark(). @return owned by the arena */
     const void* mark();
 
     /**
-     * Frees all objects made since the mark, except clones, and the marks set since.
-     * @return false when that is no mark of this arena, or no longer
+     * Frees the objects created after the mark, except clones, and the later marks.
+     * @return false if it is not a current mark of this arena
      */
     bool releaseMark(const void* mark);
 
-    /** Where clones of its objects go. */
+    /** The arena that receives the clones of its objects. */
     Arena& clones() const { return cloneArena; }
 
-    /** Takes over an object of another arena, if it is there. */
+    /** Moves an object from another arena to this one, if the other owns it. */
     void takeFrom(Arena& other, const Object& object);
 
-    /** How many objects it holds, released ones included. */
+    /** Number of objects, including released ones. */
     std::size_t size() const;
 
 private:
@@ -60,7 +59,7 @@ private:
     Arena& cloneArena;
     mutable std::mutex mutex;
     std::vector<std::unique_ptr<Object>> objects;
-    std::vector<std::unique_ptr<std::size_t>> marks;  ///< each the number of objects at its time
+    std::vector<std::unique_ptr<std::size_t>> marks;  ///< numbers of objects
 };
 
 }  // namespace cimhost

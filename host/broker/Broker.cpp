@@ -6,12 +6,12 @@
 #include <vector>
 
 #include "broker/ErrorTranslation.h"
-#include "schema/Names.h"
+#include "cim/Names.h"
 
 namespace cimhost {
 namespace {
 
-/** An arena that a thread makes objects in. */
+/** An arena that a thread has entered. */
 struct Scope {
     const Broker* broker;
     Arena* arena;
@@ -71,12 +71,12 @@ std::shared_ptr<const ClassInfo> Broker::classInfo(const std::string& className)
 }
 
 bool Broker::isA(const std::string& className, const std::string& ancestor) const {
-    if (sameName(className, ancestor)) {
+    if (cim::sameName(className, ancestor)) {
         return true;
     }
     const auto known = classInfo(className);
     return known && std::any_of(known->superclasses.begin(), known->superclasses.end(),
-                                [&](const std::string& each) { return sameName(each, ancestor); });
+                                [&](const std::string& each) { return cim::sameName(each, ancestor); });
 }
 
 void Broker::log(const LogRecord& record) const {

@@ -17,12 +17,12 @@
 
 namespace cimhost {
 
-/** A line that a provider logs or traces through the broker. */
+/** A message that a provider logs or traces through the broker. */
 struct LogRecord {
     bool isTrace = false;
     int level = 0;            ///< a CMPISeverity, or a CMPILevel of a trace
-    std::string component{};  ///< id of the message or name of the component; may be empty
-    std::string text{};
+    std::string component{};  ///< identifier of the message or name of the component; may be empty
+    std::string message{};
 };
 
 /** Receives the requests that providers send to the object manager. */
@@ -37,25 +37,24 @@ public:
     virtual Response perform(Request request) = 0;
 };
 
-/** The response to an operation that an object manager does not have. */
+/** The response to an operation that an object manager does not support. */
 Response notSupported(Operation operation);
 
-/** What a broker is made with. */
+/** The parameters of a broker. */
 struct BrokerOptions {
-    ClassInfoLookup classInfo{};  ///< none: no class is known
-    UpCalls* upCalls = nullptr;   ///< not owned; null: no up-call is supported
-    std::function<void(const LogRecord&)>
-        log{};                               ///< none: log and trace records are dropped; may be called concurrently
-    const FunctionTables* tables = nullptr;  ///< not owned; null: the standard tables
-    bool hasMemoryTable = true;              ///< whether the handle has a CMPIBrokerMemFT
+    ClassInfoLookup classInfo{};                  ///< none: all classes are unknown
+    UpCalls* upCalls = nullptr;                   ///< not owned; null: up-calls are not supported
+    std::function<void(const LogRecord&)> log{};  ///< none: records are discarded; may be called concurrently
+    const FunctionTables* tables = nullptr;       ///< not owned; null: the standard tables
+    bool hasMemoryTable = true;                   ///< whether the handle has a CMPIBrokerMemFT
 };
 
 /**
- * A CMPI broker: what providers see of the object manager.
+ * A CMPI broker, through which providers use the object manager. Thread-safe.
  *
- * Objects that a provider makes belong to the innermost request of this broker on the provider's thread
- * (RequestScope), or to the attached thread; clones, and objects made outside of both, live as long as the broker. It
- * must outlive every provider that has its handle and every request. Safe to use from several threads.
+ * An object that a provider creates belongs to the innermost request of this broker on the calling thread
+ * (RequestScope), or to the attached thread. Other objects and clones are freed with the broker, which must outlive all
+ * requests and the providers that have its handle.
  */
 class Broker {
 public:
@@ -64,37 +63,37 @@ public:
     Broker(const Broker&) = delete;
     Broker& operator=(const Broker&) = delete;
 
-    /** The broker as providers see it; belongs to this object. */
+    /** The CMPI handle; owned by this object. */
     const CMPIBroker* handle() const { return &brokerHandle; }
 
-    /** The broker behind a handle. Failure with CMPI_RC_ERR_INVALID_HANDLE if it is none. */
+    /** The broker of a handle. @throws Failure with CMPI_RC_ERR_INVALID_HANDLE if there is none */
     static Broker& of(const CMPIBroker* handle);
 
     const FunctionTables& tables() const { return *options.tables; }
     UpCalls& upCalls() const { return *options.upCalls; }
 
-    /** The class of that name; null when it is not known. */
+    /** The class of this name; null if it is unknown. */
     std::shared_ptr<const ClassInfo> classInfo(const std::string& className) const;
 
-    /** Whether the class is the other one or is known to descend from it. */
+    /** Whether a class is the ancestor or is known to be derived from it. */
     bool isA(const std::string& className, const std::string& ancestor) const;
 
     void log(const LogRecord& record) const;
 
-    /** Where objects made now on this thread go. */
+    /** The arena for objects that this thread creates now. */
     Arena& arena();
 
-    /** What is not any request's: clones, and objects made outside of requests. */
+    /** The arena of clones and of objects that are created outside of requests. */
     Arena& lasting() { return outside; }
 
-    /** The innermost arena of this thread, of whatever broker; null outside of requests. */
+    /** The innermost arena of this thread, of any broker; null outside of requests. */
     static Arena* arenaOfThread();
 
-    /** Memory for providers. */
+    /** The memory that providers allocate. */
     MemoryBlocks& memory() { return blocks; }
 
     /** @name Arenas of this thread
-     * An arena that is entered receives the objects that are made on this thread until it is left.
+     * After enter(), the arena receives the objects that this thread creates, until leave().
      */
     ///@{
     void enter(Arena& arena);
@@ -102,9 +101,8 @@ public:
     ///@}
 
     /** @name Threads of a provider
-     * prepareThread() copies the context for a thread to come, with an arena of its own. attachThread() makes that
-     * the arena of the calling thread, detachThread() ends it. The last two answer false for a context that was not
-     * prepared.
+     * prepareThread() copies a context for a new thread, with a separate arena. attachThread() enters that arena,
+     * detachThread() leaves and frees it; both return false for a context that was not prepared.
      */
     ///@{
     CMPIContext* prepareThread(const ContextEntries& entries);
@@ -118,7 +116,7 @@ private:
     Arena outside;
     MemoryBlocks blocks;
     std::mutex mutex;
-    std::map<const CMPIContext*, std::unique_ptr<Arena>> threads;  ///< by prepared context
+    std::map<const CMPIContext*, std::unique_ptr<Arena>> threads;  ///< arenas of prepared contexts
 };
 
 }  // namespace cimhost

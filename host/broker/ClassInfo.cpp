@@ -3,7 +3,7 @@
 #include <map>
 #include <utility>
 
-#include "schema/Names.h"
+#include "cim/Names.h"
 #include "schema/Schema.h"
 
 namespace cimhost {
@@ -26,7 +26,7 @@ std::shared_ptr<const ClassInfo> infoOf(const Schema& schema, const Class& known
 }  // namespace
 
 ClassInfoLookup classInfos(const Schema& schema) {
-    std::map<std::string, std::shared_ptr<const ClassInfo>, NameLess> infos;
+    std::map<std::string, std::shared_ptr<const ClassInfo>, cim::NameLess> infos;
     for (const Class* known : schema.classes()) {
         infos.emplace(known->name, infoOf(schema, *known));
     }

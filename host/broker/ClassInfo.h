@@ -11,7 +11,7 @@ namespace cimhost {
 
 class Schema;
 
-/** A property as the broker needs it. */
+/** The facts of a property that the broker uses. */
 struct PropertyInfo {
     std::string name{};
     CMPIType type = CMPI_null;  ///< element type, without CMPI_ARRAY
@@ -20,17 +20,17 @@ struct PropertyInfo {
     std::string referenceClass{};  ///< of a reference, the class that it refers to; empty otherwise
 };
 
-/** A class as the broker needs it: all properties, also inherited ones, and superclasses. */
+/** The facts of a class that the broker uses: all properties, also inherited ones, and all superclasses. */
 struct ClassInfo {
     std::string name{};
     std::vector<PropertyInfo> properties{};
     std::vector<std::string> superclasses{};  ///< names, the direct superclass first
 };
 
-/** Returns the class of that name, in any letter case; null for an unknown class. */
+/** Returns the class of a case-insensitive name; null for an unknown class. */
 using ClassInfoLookup = std::function<std::shared_ptr<const ClassInfo>(const std::string& className)>;
 
-/** A lookup of the schema's classes, which does not refer to the schema afterwards. */
+/** Returns a lookup of a schema's classes. It does not refer to the schema. */
 ClassInfoLookup classInfos(const Schema& schema);
 
 }  // namespace cimhost

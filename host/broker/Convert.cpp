@@ -10,7 +10,7 @@
 namespace cimhost {
 namespace {
 
-/** A plain type: its number, and the alternative of Scalar and the member of CMPIValue that carry it. */
+/** A plain type, with its alternative of Scalar and its member of CMPIValue. */
 template <class Alternative, class Member>
 struct PlainType {
     CMPIType type;
@@ -18,7 +18,7 @@ struct PlainType {
 
     Scalar read(const CMPIValue& value) const { return Alternative{static_cast<Alternative>(value.*member)}; }
     void write(const Alternative& plain, CMPIValue& value) const { value.*member = static_cast<Member>(plain); }
-    static bool carries(const Scalar& scalar) { return std::holds_alternative<Alternative>(scalar); }
+    static bool holds(const Scalar& scalar) { return std::holds_alternative<Alternative>(scalar); }
     void writeFrom(const Scalar& scalar, CMPIValue& value) const { write(std::get<Alternative>(scalar), value); }
 };
 
@@ -28,7 +28,7 @@ struct PlainType<Char16, CMPIChar16> {
     CMPIChar16 CMPIValue::*member;
 
     Scalar read(const CMPIValue& value) const { return Char16{value.*member}; }
-    static bool carries(const Scalar& scalar) { return std::holds_alternative<Char16>(scalar); }
+    static bool holds(const Scalar& scalar) { return std::holds_alternative<Char16>(scalar); }
     void writeFrom(const Scalar& scalar, CMPIValue& value) const { value.*member = std::get<Char16>(scalar).code; }
 };
 
@@ -45,7 +45,7 @@ constexpr auto plainTypes = std::make_tuple(
     plain<std::int32_t>(CMPI_sint32, &CMPIValue::sint32), plain<std::int64_t>(CMPI_sint64, &CMPIValue::sint64),
     plain<float>(CMPI_real32, &CMPIValue::real32), plain<double>(CMPI_real64, &CMPIValue::real64));
 
-/** Calls the action with each plain type until one answers true; whether one did. */
+/** Calls the action with each plain type until it returns true. @return whether it did */
 template <class Action>
 bool anyPlainType(Action action) {
     return std::apply([&](const auto&... each) { return (action(each) || ...); }, plainTypes);
@@ -66,17 +66,17 @@ Scalar readEncapsulated(const CMPIValue& value, CMPIType type) {
     }
 }
 
-/** Whether a value of this type is a pointer, which may be null. */
+/** Whether values of this type are pointers. */
 bool isEncapsulated(CMPIType type) {
     return (type & CMPI_ENC) != 0;
 }
 
-/** Writes what is not a plain type. */
+/** Writes values of types that are not plain. */
 struct EncapsulatedWriter {
     CMPIValue& value;
     Arena& arena;
 
-    void operator()(const std::string& text) const { value.string = arena.make<CMPIString>(text); }
+    void operator()(const std::string& string) const { value.string = arena.make<CMPIString>(string); }
     void operator()(const DateTime& time) const { value.dateTime = arena.make<CMPIDateTime>(time); }
     void operator()(const std::shared_ptr<const ObjectPath>& path) const {
         value.ref = arena.make<CMPIObjectPath>(*path);
@@ -104,7 +104,7 @@ CMPIData dataWithoutCharacters(bool isNull, Arena& arena) {
     return data;
 }
 
-/** Whether a value of a type with objects has none, or a string without characters. */
+/** Whether a value is a null pointer or a string object without characters. */
 bool lacksObject(const CMPIValue& value, CMPIType type) {
     const auto* string = type == CMPI_string ? objectOf(value.string) : nullptr;
     return value.string == nullptr || (string != nullptr && string->lacksCharacters);
@@ -178,11 +178,11 @@ CMPIData dataFrom(const Scalar& scalar, CMPIType type, Arena& arena) {
     }
     data.state = CMPI_goodValue;
     const bool isPlain = anyPlainType([&](const auto& each) {
-        const bool carries = each.carries(scalar);
-        if (carries) {
+        const bool holds = each.holds(scalar);
+        if (holds) {
             each.writeFrom(scalar, data.value);
         }
-        return carries;
+        return holds;
     });
     if (!isPlain) {
         std::visit(EncapsulatedWriter{data.value, arena}, scalar);

@@ -11,35 +11,34 @@
 namespace cimhost {
 
 /**
- * The plain value that a CMPI value is, copied. Null pointers, also inside, give a null value of that type.
- * Characters (CMPI_chars) come as the pointer itself and become a string. Failure with
- * CMPI_RC_ERR_INVALID_DATA_TYPE for a type that is no CIM type, CMPI_RC_ERR_INVALID_PARAMETER for an object that
- * is not of that type, CMPI_RC_ERR_TYPE_MISMATCH for an array of other elements.
+ * Converts a CMPI value to a plain value. A null pointer, also in a string object or an array, results in null.
+ * @param value for CMPI_chars, the characters themselves
+ * @throws Failure with CMPI_RC_ERR_INVALID_DATA_TYPE if the type is not a CIM type, CMPI_RC_ERR_INVALID_PARAMETER if an
+ * object does not have the type, CMPI_RC_ERR_TYPE_MISMATCH if the array has elements of another type
  */
 Value valueFrom(const CMPIValue* value, CMPIType type);
 
-/** The CIM type that values given with this type have, without CMPI_ARRAY: a string for characters. Failure as above.
- */
+/** The type without CMPI_ARRAY; CMPI_string for CMPI_chars. @throws Failure as valueFrom() */
 CMPIType elementType(CMPIType type);
 
-/** One element of valueFrom()'s: of a plain type, null if the pointer is null. */
+/** Converts a CMPI value that is not an array. */
 Scalar scalarFrom(const CMPIValue* value, CMPIType type);
 
-/** The value as CMPI data; objects in it are made in the arena. */
+/** Converts a value to CMPI data, whose objects are created in the arena. */
 CMPIData dataFrom(const Value& value, Arena& arena);
 
-/** One element as CMPI data. */
+/** Converts one element. */
 CMPIData dataFrom(const Scalar& scalar, CMPIType type, Arena& arena);
 
-/** Reads a property list in C: pointers to names, ended by a null pointer; a null list names all properties. */
+/** Converts a C property list: pointers to names, terminated by a null pointer. A null list means all properties. */
 PropertyList propertyListFrom(const char** names);
 
-/** A property list in C. It points into the list that it was made from, which must outlive it. */
+/** A C property list. It refers to the list that it was constructed from. */
 class CPropertyList {
 public:
     explicit CPropertyList(const PropertyList& list);
 
-    /** Null when the list names all properties. */
+    /** Null if the list means all properties. */
     const char** get() { return pointers.empty() ? nullptr : pointers.data(); }
 
 private:

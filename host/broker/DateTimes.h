@@ -4,25 +4,27 @@
 #include <optional>
 #include <string>
 
+// CIM datetimes as numbers of microseconds.
+
 namespace cimhost {
 
-/** Whether the text of a CIM datetime is an interval. */
-bool isInterval(const std::string& text);
+/** Whether a CIM datetime, with asterisks or without, is an interval. */
+bool isIntervalForm(const std::string& dateTime);
 
 /**
- * Microseconds since 1970-01-01 00:00 UTC, or of the interval; negative before 1970. None when fields of the text
- * are unknown (asterisks).
- * @param text a valid CIM datetime
+ * Microseconds since 1970-01-01 00:00 UTC, or of the interval; negative before 1970. None if fields are unknown
+ * (asterisks).
+ * @param dateTime a valid CIM datetime
  */
-std::optional<std::int64_t> microseconds(const std::string& text);
+std::optional<std::int64_t> microsecondsOf(const std::string& dateTime);
 
-/** The time as a CIM datetime in UTC; none when its year has not four digits. */
-std::optional<std::string> timeText(std::int64_t microseconds);
+/** A point in time as CIM datetime in UTC; none if the year is not in 0 to 9999. */
+std::optional<std::string> formatTime(std::int64_t microseconds);
 
-/** The interval as a CIM datetime; none when its days have more than eight digits. */
-std::optional<std::string> intervalText(std::uint64_t microseconds);
+/** An interval as CIM datetime; none if its days have more than eight digits. */
+std::optional<std::string> formatInterval(std::uint64_t microseconds);
 
-/** The time now as a CIM datetime in UTC. */
-std::string currentTimeText();
+/** The current time as CIM datetime in UTC. */
+std::string formatCurrentTime();
 
 }  // namespace cimhost

@@ -6,13 +6,13 @@
 
 namespace cimhost {
 
-/** Where an object goes that is made from another one: it belongs to the request that asks for it. */
+/** The arena for an object created from another one: that of the current request. */
 inline Arena& arenaFor(const Object& source) {
     Arena* ofThread = Broker::arenaOfThread();
     return ofThread == nullptr ? source.arena() : *ofThread;
 }
 
-/** The release function of every encapsulated type. What is left of a clone ends with the request. */
+/** The release function of all encapsulated types. The handle of a released clone is freed with the current request. */
 template <class Handle>
 CMPIStatus releaseObject(Handle* handle) {
     return guarded([&] {
@@ -24,8 +24,9 @@ CMPIStatus releaseObject(Handle* handle) {
     });
 }
 
-/** The clone function of every encapsulated type: an independent copy that lives until its release, and as long as the
- *  broker at most. */
+/** The clone function of all encapsulated types. The clone is valid until its release, or until the broker is
+ * destroyed.
+ */
 template <class Handle>
 Handle* cloneObject(const Handle* handle, CMPIStatus* rc) {
     return guarded<Handle*>(rc, nullptr, [&] {

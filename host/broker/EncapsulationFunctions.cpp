@@ -7,20 +7,20 @@
 #include "broker/FunctionTables.h"
 #include "broker/Messages.h"
 #include "broker/NamedValues.h"
-#include "broker/ToText.h"
-#include "schema/Text.h"
+#include "broker/ObjectDescription.h"
+#include "cim/DateTime.h"
 
-// CMPIBrokerEncFT: making encapsulated objects, and services around them.
+// CMPIBrokerEncFT: creates encapsulated objects; logging, messages and types.
 
 namespace cimhost {
 namespace {
 
-/** The arena for a new object. Failure when the handle is no broker's. */
+/** The arena for a new object. @throws Failure if the handle is not that of a broker */
 Arena& arenaOf(const CMPIBroker* broker) {
     return Broker::of(broker).arena();
 }
 
-/** The keys of the path that are properties of the class, with their values. */
+/** The keys of a path that are properties of the class. */
 std::vector<NamedValue> keyProperties(const ObjectPath& path, const ClassInfo& classInfo) {
     std::vector<NamedValue> properties;
     for (const PropertyInfo& property : classInfo.properties) {
@@ -32,7 +32,7 @@ std::vector<NamedValue> keyProperties(const ObjectPath& path, const ClassInfo& c
     return properties;
 }
 
-/** An instance of a class that is known begins with its keys, any other without properties. */
+/** A new instance of a known class has its keys as properties; that of another class has no properties. */
 CMPIInstance* newInstance(const CMPIBroker* broker, const CMPIObjectPath* path, CMPIStatus* rc) {
     return guarded<CMPIInstance*>(rc, nullptr, [&] {
         Broker& owner = Broker::of(broker);
@@ -41,7 +41,7 @@ CMPIInstance* newInstance(const CMPIBroker* broker, const CMPIObjectPath* path, 
         content.classInfo = owner.classInfo(content.value.path.className);
         if (content.classInfo) {
             content.value.properties = keyProperties(content.value.path, *content.classInfo);
-            content.given = content.value.properties.size();
+            content.initialCount = content.value.properties.size();
         }
         return owner.arena().make<CMPIInstance>(std::move(content));
     });
@@ -61,8 +61,8 @@ CMPIArgs* newArgs(const CMPIBroker* broker, CMPIStatus* rc) {
     return guarded<CMPIArgs*>(rc, nullptr, [&] { return arenaOf(broker).make<CMPIArgs>({}); });
 }
 
-CMPIString* newString(const CMPIBroker* broker, const char* text, CMPIStatus* rc) {
-    return guarded<CMPIString*>(rc, nullptr, [&] { return arenaOf(broker).make<CMPIString>(argument(text)); });
+CMPIString* newString(const CMPIBroker* broker, const char* characters, CMPIStatus* rc) {
+    return guarded<CMPIString*>(rc, nullptr, [&] { return arenaOf(broker).make<CMPIString>(argument(characters)); });
 }
 
 CMPIArray* newArray(const CMPIBroker* broker, CMPICount size, CMPIType type, CMPIStatus* rc) {
@@ -75,33 +75,34 @@ CMPIArray* newArray(const CMPIBroker* broker, CMPICount size, CMPIType type, CMP
 }
 
 CMPIDateTime* newDateTime(const CMPIBroker* broker, CMPIStatus* rc) {
-    return guarded<CMPIDateTime*>(rc, nullptr, [&] { return arenaOf(broker).make<CMPIDateTime>({currentTimeText()}); });
+    return guarded<CMPIDateTime*>(rc, nullptr,
+                                  [&] { return arenaOf(broker).make<CMPIDateTime>({formatCurrentTime()}); });
 }
 
 CMPIDateTime* newDateTimeFromBinary(const CMPIBroker* broker, CMPIUint64 microseconds, CMPIBoolean interval,
                                     CMPIStatus* rc) {
     return guarded<CMPIDateTime*>(rc, nullptr, [&] {
-        const std::optional<std::string> text =
-            interval != 0 ? intervalText(microseconds) : timeText(static_cast<std::int64_t>(microseconds));
-        if (!text) {
+        const std::optional<std::string> formatted =
+            interval != 0 ? formatInterval(microseconds) : formatTime(static_cast<std::int64_t>(microseconds));
+        if (!formatted) {
             throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "The time is out of range.");
         }
-        return arenaOf(broker).make<CMPIDateTime>({*text});
+        return arenaOf(broker).make<CMPIDateTime>({*formatted});
     });
 }
 
-CMPIDateTime* newDateTimeFromChars(const CMPIBroker* broker, const char* text, CMPIStatus* rc) {
+CMPIDateTime* newDateTimeFromChars(const CMPIBroker* broker, const char* characters, CMPIStatus* rc) {
     return guarded<CMPIDateTime*>(rc, nullptr, [&] {
         Arena& arena = arenaOf(broker);
-        const std::string time = argument(text);
-        if (!isDateTime(time)) {
-            throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "'" + time + "' is no CIM datetime.");
+        const std::string dateTime = argument(characters);
+        if (!cim::isDateTime(dateTime)) {
+            throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "'" + dateTime + "' is not a CIM datetime.");
         }
-        return arena.make<CMPIDateTime>({time});
+        return arena.make<CMPIDateTime>({dateTime});
     });
 }
 
-/** Queries are not supported, so nobody ever has a CMPISelectExp. */
+/** Queries are not supported, so there is never a CMPISelectExp. */
 CMPISelectExp* newSelectExp(const CMPIBroker* broker, const char*, const char*, CMPIArray** projection,
                             CMPIStatus* rc) {
     return guarded<CMPISelectExp*>(rc, nullptr, [&]() -> CMPISelectExp* {
@@ -120,7 +121,7 @@ CMPIBoolean classPathIsA(const CMPIBroker* broker, const CMPIObjectPath* path, c
     });
 }
 
-/** The broker's side of an encapsulated object of any type: every handle begins with the pointer to it. */
+/** The object of a handle of any type: all handles begin with the pointer to it. */
 const Object& anyObject(const CMPIBroker* broker, const void* handle) {
     Broker::of(broker);
     const void* object = nullptr;
@@ -135,47 +136,48 @@ const Object& anyObject(const CMPIBroker* broker, const void* handle) {
 
 CMPIString* toString(const CMPIBroker* broker, const void* object, CMPIStatus* rc) {
     return guarded<CMPIString*>(rc, nullptr,
-                                [&] { return arenaOf(broker).make<CMPIString>(toText(anyObject(broker, object))); });
+                                [&] { return arenaOf(broker).make<CMPIString>(describe(anyObject(broker, object))); });
 }
 
 CMPIBoolean isOfType(const CMPIBroker* broker, const void* object, const char* type, CMPIStatus* rc) {
     return guarded<CMPIBoolean>(rc, 0, [&] {
-        const std::string actual = typeText(anyObject(broker, object).kind());
+        const std::string actual = typeNameOf(anyObject(broker, object).kind());
         return static_cast<CMPIBoolean>(argument(type) == actual ? 1 : 0);
     });
 }
 
 CMPIString* getType(const CMPIBroker* broker, const void* object, CMPIStatus* rc) {
     return guarded<CMPIString*>(
-        rc, nullptr, [&] { return arenaOf(broker).make<CMPIString>(typeText(anyObject(broker, object).kind())); });
+        rc, nullptr, [&] { return arenaOf(broker).make<CMPIString>(typeNameOf(anyObject(broker, object).kind())); });
 }
 
-CMPIStatus record(const CMPIBroker* broker, LogRecord record, const char* component, const char* text,
+/** @param characters the message; null: it is in the string */
+CMPIStatus record(const CMPIBroker* broker, LogRecord record, const char* component, const char* characters,
                   const CMPIString* string) {
     return guarded([&] {
         const Broker& owner = Broker::of(broker);
         record.component = component == nullptr ? "" : component;
-        if (text != nullptr) {
-            record.text = text;
+        if (characters != nullptr) {
+            record.message = characters;
         } else if (string != nullptr) {
-            record.text = content(string);
+            record.message = content(string);
         }
         owner.log(record);
     });
 }
 
-CMPIStatus logMessage(const CMPIBroker* broker, int severity, const char* id, const char* text,
+CMPIStatus logMessage(const CMPIBroker* broker, int severity, const char* id, const char* characters,
                       const CMPIString* string) {
-    return record(broker, {false, severity, {}, {}}, id, text, string);
+    return record(broker, {false, severity, {}, {}}, id, characters, string);
 }
 
-CMPIStatus trace(const CMPIBroker* broker, int level, const char* component, const char* text,
+CMPIStatus trace(const CMPIBroker* broker, int level, const char* component, const char* characters,
                  const CMPIString* string) {
-    return record(broker, {true, level, {}, {}}, component, text, string);
+    return record(broker, {true, level, {}, {}}, component, characters, string);
 }
 
-std::optional<std::string> optionalText(const char* text) {
-    return text == nullptr ? std::nullopt : std::optional<std::string>(text);
+std::optional<std::string> optionalString(const char* characters) {
+    return characters == nullptr ? std::nullopt : std::optional<std::string>(characters);
 }
 
 CMPIError* newCMPIError(const CMPIBroker* broker, const char* owner, const char* id, const char* message,
@@ -183,9 +185,9 @@ CMPIError* newCMPIError(const CMPIBroker* broker, const char* owner, const char*
                         CMPIStatus* rc) {
     return guarded<CMPIError*>(rc, nullptr, [&] {
         ErrorInfo error;
-        error.owningEntity = optionalText(owner);
-        error.messageId = optionalText(id);
-        error.message = optionalText(message);
+        error.owningEntity = optionalString(owner);
+        error.messageId = optionalString(id);
+        error.message = optionalString(message);
         error.severity = severity;
         error.probableCause = cause;
         error.statusCode = code;
@@ -193,7 +195,7 @@ CMPIError* newCMPIError(const CMPIBroker* broker, const char* owner, const char*
     });
 }
 
-/** There are no message files: providers fall back to their default texts. */
+/** There are no message files: providers use their default messages. */
 CMPIStatus openMessageFile(const CMPIBroker* broker, const char*, CMPIMsgFileHandle* file) {
     return guarded([&] {
         Broker::of(broker);

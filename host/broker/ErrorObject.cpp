@@ -16,35 +16,36 @@ CMPIStatus setPlain(CMPIError* error, const std::decay_t<decltype(std::declval<E
 }
 
 template <std::optional<std::string> ErrorInfo::*member>
-CMPIString* getText(const CMPIError* error, CMPIStatus* rc) {
+CMPIString* getString(const CMPIError* error, CMPIStatus* rc) {
     return guarded<CMPIString*>(rc, nullptr, [&]() -> CMPIString* {
         const auto& object = self(error);
-        const std::optional<std::string>& text = (*object.content).*member;
-        return text ? arenaFor(object).make<CMPIString>(*text) : nullptr;
+        const std::optional<std::string>& value = (*object.content).*member;
+        return value ? arenaFor(object).make<CMPIString>(*value) : nullptr;
     });
 }
 
 template <std::optional<std::string> ErrorInfo::*member>
-CMPIStatus setText(CMPIError* error, const char* text) {
-    return guarded([&] { content(error).*member = text == nullptr ? std::nullopt : std::optional<std::string>(text); });
+CMPIStatus setString(CMPIError* error, const char* value) {
+    return guarded(
+        [&] { content(error).*member = value == nullptr ? std::nullopt : std::optional<std::string>(value); });
 }
 
-using Texts = std::optional<std::vector<std::string>>;
+using Strings = std::optional<std::vector<std::string>>;
 
-template <Texts ErrorInfo::*member>
-CMPIArray* getTexts(const CMPIError* error, CMPIStatus* rc) {
+template <Strings ErrorInfo::*member>
+CMPIArray* getStrings(const CMPIError* error, CMPIStatus* rc) {
     return guarded<CMPIArray*>(rc, nullptr, [&]() -> CMPIArray* {
         const auto& object = self(error);
-        const Texts& texts = (*object.content).*member;
-        if (!texts) {
+        const Strings& strings = (*object.content).*member;
+        if (!strings) {
             return nullptr;
         }
-        return arenaFor(object).make<CMPIArray>({CMPI_string, {texts->begin(), texts->end()}});
+        return arenaFor(object).make<CMPIArray>({CMPI_string, {strings->begin(), strings->end()}});
     });
 }
 
-/** Null elements become empty texts. */
-Texts textsFrom(const CMPIArray* array) {
+/** Null elements become empty strings. */
+Strings stringsFrom(const CMPIArray* array) {
     if (array == nullptr) {
         return std::nullopt;
     }
@@ -52,20 +53,20 @@ Texts textsFrom(const CMPIArray* array) {
     if (from.type != CMPI_string) {
         throw Failure(CMPI_RC_ERR_INVALID_PARAMETER);
     }
-    std::vector<std::string> texts;
+    std::vector<std::string> strings;
     for (const Scalar& element : from.elements) {
-        const auto* text = std::get_if<std::string>(&element);
-        texts.push_back(text == nullptr ? std::string{} : *text);
+        const auto* string = std::get_if<std::string>(&element);
+        strings.push_back(string == nullptr ? std::string{} : *string);
     }
-    return texts;
+    return strings;
 }
 
 CMPIStatus setRecommendedActions(CMPIError* error, const CMPIArray* actions) {
-    return guarded([&] { content(error).recommendedActions = textsFrom(actions); });
+    return guarded([&] { content(error).recommendedActions = stringsFrom(actions); });
 }
 
 CMPIStatus setMessageArguments(CMPIError* error, CMPIArray* arguments) {
-    return guarded([&] { content(error).messageArguments = textsFrom(arguments); });
+    return guarded([&] { content(error).messageArguments = stringsFrom(arguments); });
 }
 
 }  // namespace
@@ -74,28 +75,28 @@ const CMPIErrorFT errorTable{tableVersion,
                              releaseObject<CMPIError>,
                              cloneObject<CMPIError>,
                              getPlain<&ErrorInfo::type>,
-                             getText<&ErrorInfo::otherType>,
-                             getText<&ErrorInfo::owningEntity>,
-                             getText<&ErrorInfo::messageId>,
-                             getText<&ErrorInfo::message>,
+                             getString<&ErrorInfo::otherType>,
+                             getString<&ErrorInfo::owningEntity>,
+                             getString<&ErrorInfo::messageId>,
+                             getString<&ErrorInfo::message>,
                              getPlain<&ErrorInfo::severity>,
                              getPlain<&ErrorInfo::probableCause>,
-                             getText<&ErrorInfo::probableCauseDescription>,
-                             getTexts<&ErrorInfo::recommendedActions>,
-                             getText<&ErrorInfo::source>,
+                             getString<&ErrorInfo::probableCauseDescription>,
+                             getStrings<&ErrorInfo::recommendedActions>,
+                             getString<&ErrorInfo::source>,
                              getPlain<&ErrorInfo::sourceFormat>,
-                             getText<&ErrorInfo::otherSourceFormat>,
+                             getString<&ErrorInfo::otherSourceFormat>,
                              getPlain<&ErrorInfo::statusCode>,
-                             getText<&ErrorInfo::statusCodeDescription>,
-                             getTexts<&ErrorInfo::messageArguments>,
+                             getString<&ErrorInfo::statusCodeDescription>,
+                             getStrings<&ErrorInfo::messageArguments>,
                              setPlain<&ErrorInfo::type>,
-                             setText<&ErrorInfo::otherType>,
-                             setText<&ErrorInfo::probableCauseDescription>,
+                             setString<&ErrorInfo::otherType>,
+                             setString<&ErrorInfo::probableCauseDescription>,
                              setRecommendedActions,
-                             setText<&ErrorInfo::source>,
+                             setString<&ErrorInfo::source>,
                              setPlain<&ErrorInfo::sourceFormat>,
-                             setText<&ErrorInfo::otherSourceFormat>,
-                             setText<&ErrorInfo::statusCodeDescription>,
+                             setString<&ErrorInfo::otherSourceFormat>,
+                             setString<&ErrorInfo::statusCodeDescription>,
                              setMessageArguments};
 
 }  // namespace cimhost

@@ -6,16 +6,16 @@
 namespace cimhost {
 
 CMPIStatus toCmpi(const Status& status) noexcept {
-    CMPIStatus answer{static_cast<CMPIrc>(status.rc), nullptr};
+    CMPIStatus converted{static_cast<CMPIrc>(status.rc), nullptr};
     Arena* arena = status.message.empty() ? nullptr : Broker::arenaOfThread();
     if (arena != nullptr) {
         try {
-            answer.msg = arena->make<CMPIString>(status.message);
+            converted.msg = arena->make<CMPIString>(status.message);
         } catch (...) {
-            answer.msg = nullptr;  // out of memory: the code alone has to do
+            converted.msg = nullptr;  // out of memory: return the code only
         }
     }
-    return answer;
+    return converted;
 }
 
 Status statusOfCurrentException() noexcept {
@@ -34,11 +34,11 @@ Status statusOfCurrentException() noexcept {
     }
 }
 
-std::string argument(const char* text) {
-    if (text == nullptr) {
+std::string argument(const char* characters) {
+    if (characters == nullptr) {
         throw Failure(CMPI_RC_ERR_INVALID_PARAMETER);
     }
-    return text;
+    return characters;
 }
 
 }  // namespace cimhost

@@ -10,11 +10,11 @@
 #include "broker/Object.h"
 #include "model/Status.h"
 
-// The C boundary: inside, functions throw Failure; outside, callers see a CMPIStatus and a harmless value.
+// The C boundary: table functions throw Failure; their callers receive a CMPIStatus and a null or zero value.
 
 namespace cimhost {
 
-/** Ends a table function with a status other than OK. */
+/** An exception that ends a table function with a status other than OK. */
 class Failure {
 public:
     explicit Failure(int rc, std::string message = {}) : reason{rc, std::move(message)} {}
@@ -26,13 +26,13 @@ private:
     Status reason;
 };
 
-/** The status as C; its message, if any, is an object of the current request. Never throws. */
+/** Converts a status. Its message, if it has one, becomes an object of the current request. */
 CMPIStatus toCmpi(const Status& status) noexcept;
 
-/** The status that stands for the exception being handled; only in a catch block. */
+/** Converts the current exception to a status. Call it in a catch block. */
 Status statusOfCurrentException() noexcept;
 
-/** Runs the body of a function that answers a status. What it throws becomes that status. */
+/** Runs the body of a function that returns a status. Exceptions become that status. */
 template <class Body>
 CMPIStatus guarded(Body&& body) {
     try {
@@ -45,7 +45,8 @@ CMPIStatus guarded(Body&& body) {
     }
 }
 
-/** Runs the body of a function that answers a value. What it throws becomes *rc, unless rc is null, and failed. */
+/** Runs the body of a function that returns a value. After an exception, the status is in *rc, and the value is failed.
+ *  @param rc may be null */
 template <class Result, class Body>
 Result guarded(CMPIStatus* rc, Result failed, Body&& body) {
     Result result = failed;
@@ -56,14 +57,14 @@ Result guarded(CMPIStatus* rc, Result failed, Body&& body) {
     return status.rc == CMPI_RC_OK ? result : failed;
 }
 
-/** Data that says nothing, as getters answer together with a status. */
+/** The data that getters return with an error. */
 inline CMPIData badData() {
     CMPIData data{};
     data.state = CMPI_badValue;
     return data;
 }
 
-/** The object that a table function is called on. Failure with CMPI_RC_ERR_INVALID_HANDLE if it is none. */
+/** The object that a table function is called on. @throws Failure with CMPI_RC_ERR_INVALID_HANDLE if there is none */
 template <class Handle>
 Encapsulated<Handle>& self(const Handle* handle) {
     Encapsulated<Handle>* object = objectOf(handle);
@@ -79,7 +80,7 @@ typename Traits<Handle>::Content& content(const Handle* handle) {
     return *self(handle).content;
 }
 
-/** The content of an object given as an argument. Failure with CMPI_RC_ERR_INVALID_PARAMETER if it is none. */
+/** The content of an argument. @throws Failure with CMPI_RC_ERR_INVALID_PARAMETER if it is not a live object */
 template <class Handle>
 typename Traits<Handle>::Content& argument(const Handle* handle) {
     Encapsulated<Handle>* object = objectOf(handle);
@@ -89,7 +90,7 @@ typename Traits<Handle>::Content& argument(const Handle* handle) {
     return *object->content;
 }
 
-/** A text given as an argument. Failure with CMPI_RC_ERR_INVALID_PARAMETER if it is null. */
-std::string argument(const char* text);
+/** The string of an argument. @throws Failure with CMPI_RC_ERR_INVALID_PARAMETER if it is null */
+std::string argument(const char* characters);
 
 }  // namespace cimhost

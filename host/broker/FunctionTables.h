@@ -5,8 +5,7 @@
 namespace cimhost {
 
 /**
- * All function tables that a provider meets. Objects point into the set that their broker was made with, so it
- * must outlive the broker.
+ * All function tables of a broker and its objects. They must outlive the broker.
  */
 struct FunctionTables {
     CMPIBrokerFT broker;
@@ -25,12 +24,12 @@ struct FunctionTables {
     CMPIErrorFT error;
 };
 
-/** The tables of this host, with every function. They live as long as the program. */
+/** The standard tables, with all functions; valid until the program ends. */
 const FunctionTables& standardTables();
 
-// The single tables, each defined beside its functions.
+// The single tables; each is defined in the file of its functions.
 
-/** Version of the standard that the tables follow. */
+/** The version of CMPI that the tables implement. */
 constexpr int tableVersion = CMPIVersion200;
 
 extern const CMPIBrokerFT brokerTable;
@@ -48,7 +47,7 @@ extern const CMPIContextFT contextTable;
 extern const CMPIResultFT resultTable;
 extern const CMPIErrorFT errorTable;
 
-/** A setPropertyFilter for instances that also hides keys that are not listed. */
+/** A setPropertyFilter that also hides unlisted keys. */
 CMPIStatus setPropertyFilterWithKeys(CMPIInstance* instance, const char** properties, const char** keys);
 
 }  // namespace cimhost

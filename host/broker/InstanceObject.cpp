@@ -4,14 +4,14 @@
 #include "broker/Encapsulation.h"
 #include "broker/FunctionTables.h"
 #include "broker/NamedValues.h"
-#include "schema/Names.h"
+#include "cim/Names.h"
 
 namespace cimhost {
 namespace {
 
 const PropertyInfo* findProperty(const ClassInfo& classInfo, const std::string& name) {
     const auto found = std::find_if(classInfo.properties.begin(), classInfo.properties.end(),
-                                    [&](const PropertyInfo& each) { return sameName(each.name, name); });
+                                    [&](const PropertyInfo& each) { return cim::sameName(each.name, name); });
     return found == classInfo.properties.end() ? nullptr : &*found;
 }
 
@@ -20,14 +20,14 @@ bool isKey(const InstanceContent& instance, const std::string& name) {
     return classInfo != nullptr ? classInfo->isKey : findNamed(instance.value.path.keys, name) != nullptr;
 }
 
-/** Whether the property filter lets the property through. Keys usually pass: without them an instance is nameless. */
+/** Whether the property filter accepts a property. It usually accepts keys, which identify the instance. */
 bool accepts(const InstanceContent& instance, const std::string& name) {
     const PropertyList& list = instance.accepted;
     return !list || (!instance.filtersKeys && isKey(instance, name)) ||
-           std::any_of(list->begin(), list->end(), [&](const std::string& each) { return sameName(each, name); });
+           std::any_of(list->begin(), list->end(), [&](const std::string& each) { return cim::sameName(each, name); });
 }
 
-/** Failure when the class is known and has no such property, or has it with another type. */
+/** @throws Failure if the class is known and does not have the property, or has it with another type */
 void checkAgainstClass(const ClassInfo* classInfo, const std::string& name, const Value& value) {
     if (classInfo == nullptr) {
         return;
@@ -42,15 +42,15 @@ void checkAgainstClass(const ClassInfo* classInfo, const std::string& name, cons
     }
 }
 
-/** A property that the broker put in itself gives up its place: the order is that in which the provider sets. */
-void withdrawGiven(InstanceContent& target, const std::string& name) {
+/** Removes a property that the broker added: the order is that in which the provider sets properties. */
+void removeInitial(InstanceContent& target, const std::string& name) {
     auto& values = target.value.properties;
-    const auto end = values.begin() + static_cast<std::ptrdiff_t>(target.given);
+    const auto end = values.begin() + static_cast<std::ptrdiff_t>(target.initialCount);
     const auto found =
-        std::find_if(values.begin(), end, [&](const NamedValue& each) { return sameName(each.name, name); });
+        std::find_if(values.begin(), end, [&](const NamedValue& each) { return cim::sameName(each.name, name); });
     if (found != end) {
         values.erase(found);
-        --target.given;
+        --target.initialCount;
     }
 }
 
@@ -64,7 +64,7 @@ CMPIStatus setProperty(const CMPIInstance* instance, const char* name, const CMP
         Value converted = valueFrom(value, type);
         checkAgainstClass(target.classInfo.get(), property, converted);
         if (accepts(target, property)) {
-            withdrawGiven(target, property);
+            removeInitial(target, property);
             setNamed(target.value.properties, property, std::move(converted));
         }
     });
@@ -72,7 +72,7 @@ CMPIStatus setProperty(const CMPIInstance* instance, const char* name, const CMP
 
 CMPIStatus setPropertyWithOrigin(const CMPIInstance* instance, const char* name, const CMPIValue* value,
                                  const CMPIType type, const char*) {
-    return setProperty(instance, name, value, type);  // origins are the class model's, not kept with values
+    return setProperty(instance, name, value, type);  // the class declares the origin
 }
 
 CMPIData asProperty(CMPIData data, const InstanceContent& instance, const std::string& name) {
@@ -124,13 +124,13 @@ CMPIStatus filter(CMPIInstance* instance, const char** properties, bool filtersK
         target.filtersKeys = filtersKeys;
         auto& values = target.value.properties;
         const auto isHidden = [&](const NamedValue& each) { return !accepts(target, each.name); };
-        const auto given = values.begin() + static_cast<std::ptrdiff_t>(target.given);
-        target.given -= static_cast<std::size_t>(std::count_if(values.begin(), given, isHidden));
+        const auto initialEnd = values.begin() + static_cast<std::ptrdiff_t>(target.initialCount);
+        target.initialCount -= static_cast<std::size_t>(std::count_if(values.begin(), initialEnd, isHidden));
         values.erase(std::remove_if(values.begin(), values.end(), isHidden), values.end());
     });
 }
 
-/** The list of keys is ignored, as the standard allows: the broker knows them. */
+/** The keys parameter is ignored, as the standard permits: the broker knows the keys. */
 CMPIStatus setPropertyFilter(CMPIInstance* instance, const char** properties, const char**) {
     return filter(instance, properties, false);
 }

@@ -8,17 +8,16 @@
 
 namespace cimhost {
 
-/** Memory that providers ask the broker for. Blocks nobody frees are freed with it. Safe to use from several threads.
- */
+/** Memory that providers allocate through the broker. The destructor frees the remaining blocks. Thread-safe. */
 class MemoryBlocks {
 public:
-    /** Zeroed memory, at least one byte; null when there is none. */
+    /** Allocates zeroed memory, at least one byte; null if out of memory. */
     void* allocate(std::size_t count, std::size_t size);
 
-    /** Like realloc; null, and nothing changed, for a pointer that is no block or when there is no memory. */
+    /** Like realloc. Returns null and changes nothing if the pointer is not a block, or if out of memory. */
     void* resize(void* block, std::size_t size);
 
-    /** Frees a block; any other pointer is left alone. */
+    /** Frees a block; ignores other pointers. */
     void free(void* block);
 
 private:

@@ -5,7 +5,7 @@
 #include "broker/Encapsulation.h"
 #include "broker/FunctionTables.h"
 
-// CMPIBrokerMemFT: marks, plain memory, and freeing objects before their request ends.
+// CMPIBrokerMemFT: marks, memory blocks, and freeing objects before their request ends.
 
 namespace cimhost {
 
@@ -48,7 +48,7 @@ void MemoryBlocks::free(void* block) {
 namespace {
 
 CMPIGcStat* mark(const CMPIBroker* broker, CMPIStatus* rc) {
-    // The standard's marks are pointers without const; the provider only hands them back.
+    // CMPI's marks are pointers without const; providers only pass them to release().
     return guarded<CMPIGcStat*>(rc, nullptr,
                                 [&] { return const_cast<CMPIGcStat*>(Broker::of(broker).arena().mark()); });
 }
@@ -56,7 +56,7 @@ CMPIGcStat* mark(const CMPIBroker* broker, CMPIStatus* rc) {
 CMPIStatus release(const CMPIBroker* broker, const CMPIGcStat* marked) {
     return guarded([&] {
         if (!Broker::of(broker).arena().releaseMark(marked)) {
-            throw Failure(CMPI_RC_ERR_FAILED, "That is no mark of this request.");
+            throw Failure(CMPI_RC_ERR_FAILED, "This is not a mark of the current request.");
         }
     });
 }
@@ -73,13 +73,13 @@ void* cmpiRealloc(const CMPIBroker* broker, void* block, size_t size) {
     return guarded<void*>(nullptr, nullptr, [&] { return Broker::of(broker).memory().resize(block, size); });
 }
 
-char* cmpiStrDup(const CMPIBroker* broker, const char* text) {
-    if (text == nullptr) {
+char* cmpiStrDup(const CMPIBroker* broker, const char* string) {
+    if (string == nullptr) {
         return nullptr;
     }
-    const size_t size = std::strlen(text) + 1;
+    const size_t size = std::strlen(string) + 1;
     void* copy = cmpiMalloc(broker, size);
-    return copy == nullptr ? nullptr : static_cast<char*>(std::memcpy(copy, text, size));
+    return copy == nullptr ? nullptr : static_cast<char*>(std::memcpy(copy, string, size));
 }
 
 void cmpiFree(const CMPIBroker* broker, void* block) {
@@ -93,7 +93,7 @@ void freeObject(const CMPIBroker* broker, Handle* handle) {
     }
 }
 
-/** Nobody has one: queries are not supported. */
+/** There is none: queries are not supported. */
 void freeSelectExp(const CMPIBroker*, CMPISelectExp*) {}
 
 }  // namespace

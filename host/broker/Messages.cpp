@@ -9,17 +9,17 @@
 namespace cimhost {
 namespace {
 
-constexpr CMPICount mostInserts = 10;
+constexpr CMPICount mostArguments = 10;
 
-/** The inserts of a message, read one after the other. */
-class Inserts {
+/** Reads the arguments of a message. */
+class MessageArguments {
 public:
-    explicit Inserts(va_list itsList) { va_copy(list, itsList); }
-    ~Inserts() { va_end(list); }
-    Inserts(const Inserts&) = delete;
-    Inserts& operator=(const Inserts&) = delete;
+    explicit MessageArguments(va_list itsList) { va_copy(list, itsList); }
+    ~MessageArguments() { va_end(list); }
+    MessageArguments(const MessageArguments&) = delete;
+    MessageArguments& operator=(const MessageArguments&) = delete;
 
-    /** The next one as text. Failure with CMPI_RC_ERR_TYPE_MISMATCH for a type that is none of an insert's. */
+    /** Formats the next argument. @throws Failure with CMPI_RC_ERR_TYPE_MISMATCH for other types */
     std::string next() {
         switch (va_arg(list, int)) {
             case CMPI_sint32:
@@ -47,43 +47,46 @@ private:
     va_list list;
 };
 
-/** The template with its inserts; triggers without an insert stay. */
-std::string expanded(const std::string& text, const std::vector<std::string>& inserts) {
+/** Replaces $0 to $9 by the arguments that exist. */
+std::string expanded(const std::string& pattern, const std::vector<std::string>& arguments) {
     std::string result;
-    for (std::size_t i = 0; i < text.size(); ++i) {
-        const bool isTrigger = text[i] == '$' && i + 1 < text.size() && text[i + 1] >= '0' && text[i + 1] <= '9';
-        const std::size_t index = isTrigger ? static_cast<std::size_t>(text[i + 1] - '0') : inserts.size();
-        if (index < inserts.size()) {
-            result += inserts[index];
+    for (std::size_t i = 0; i < pattern.size(); ++i) {
+        const bool isReference =
+            pattern[i] == '$' && i + 1 < pattern.size() && pattern[i + 1] >= '0' && pattern[i + 1] <= '9';
+        const std::size_t index = isReference ? static_cast<std::size_t>(pattern[i + 1] - '0') : arguments.size();
+        if (index < arguments.size()) {
+            result += arguments[index];
             ++i;
         } else {
-            result += text[i];
+            result += pattern[i];
         }
     }
     return result;
 }
 
-std::string message(const char* text, CMPICount count, va_list list) {
-    const std::string unexpanded = argument(text);
-    if (count > mostInserts) {
+std::string message(const char* defaultTemplate, CMPICount count, va_list list) {
+    const std::string pattern = argument(defaultTemplate);
+    if (count > mostArguments) {
         throw Failure(CMPI_RC_ERR_INVALID_PARAMETER);
     }
-    Inserts given(list);
-    std::vector<std::string> inserts;
-    while (inserts.size() < count) {
-        inserts.push_back(given.next());
+    MessageArguments reader(list);
+    std::vector<std::string> arguments;
+    while (arguments.size() < count) {
+        arguments.push_back(reader.next());
     }
-    return expanded(unexpanded, inserts);
+    return expanded(pattern, arguments);
 }
 
 }  // namespace
 
-CMPIString* messageFromList(const CMPIBroker* broker, const char* text, CMPIStatus* rc, CMPICount count, va_list list) {
-    CMPIString* result = guarded<CMPIString*>(
-        rc, nullptr, [&] { return Broker::of(broker).arena().make<CMPIString>(message(text, count, list)); });
-    if (result == nullptr && text != nullptr) {
-        result =
-            guarded<CMPIString*>(nullptr, nullptr, [&] { return Broker::of(broker).arena().make<CMPIString>(text); });
+CMPIString* messageFromList(const CMPIBroker* broker, const char* defaultTemplate, CMPIStatus* rc, CMPICount count,
+                            va_list list) {
+    CMPIString* result = guarded<CMPIString*>(rc, nullptr, [&] {
+        return Broker::of(broker).arena().make<CMPIString>(message(defaultTemplate, count, list));
+    });
+    if (result == nullptr && defaultTemplate != nullptr) {
+        result = guarded<CMPIString*>(nullptr, nullptr,
+                                      [&] { return Broker::of(broker).arena().make<CMPIString>(defaultTemplate); });
     }
     return result;
 }

@@ -6,10 +6,11 @@
 
 namespace cimhost {
 
-/** @name Messages with inserts
- * The template with $0 to $9 replaced by the inserts, which come as count pairs of a CMPIType and a value: sint32,
- * uint32, sint64, uint64, real64, boolean, chars or string. There are no translations, so the default template is
- * always used. With a status other than OK the answer is the template as it stands.
+/** @name Messages with arguments
+ * Return the default template with $0 to $9 replaced by the arguments. There are no translations.
+ *
+ * The arguments are count pairs of a CMPIType and a value of type sint32, uint32, sint64, uint64, real64, boolean,
+ * chars or string. After an error, the functions return the template without replacements.
  */
 ///@{
 CMPIString* getMessage(const CMPIBroker* broker, const char* id, const char* defaultTemplate, CMPIStatus* rc,
@@ -17,9 +18,9 @@ CMPIString* getMessage(const CMPIBroker* broker, const char* id, const char* def
 CMPIString* getMessage2(const CMPIBroker* broker, const char* id, CMPIMsgFileHandle file, const char* defaultTemplate,
                         CMPIStatus* rc, CMPICount count, ...);
 
-/** Both of them, with the inserts as a list. */
+/** Implements both functions. */
 CMPIString* messageFromList(const CMPIBroker* broker, const char* defaultTemplate, CMPIStatus* rc, CMPICount count,
-                            va_list inserts);
+                            va_list arguments);
 ///@}
 
 }  // namespace cimhost

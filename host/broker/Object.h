@@ -10,7 +10,7 @@ namespace cimhost {
 
 class Arena;
 
-/** Something that an arena owns: the broker's side of an encapsulated object. */
+/** The broker's side of an encapsulated object. Owned by an arena. */
 class Object {
 public:
     Object(Arena& itsOwner, ObjectKind itsKind) : owner(itsOwner), kindOf(itsKind) {}
@@ -18,17 +18,17 @@ public:
     Object(const Object&) = delete;
     Object& operator=(const Object&) = delete;
 
-    /** The arena that it was made in. */
+    /** The arena that it was created in. */
     Arena& arena() const { return owner; }
     ObjectKind kind() const { return kindOf; }
 
-    /** Clones live until somebody releases them: they outlive requests and marks. */
+    /** Clones are valid until their release: they outlive requests and marks. */
     bool isClone = false;
 
     /** A string object whose character pointer is null, which some object managers pass. */
     bool lacksCharacters = false;
 
-    /** Becomes true when the object is released or goes; may be null. */
+    /** Set to true when the object is released or destroyed; may be null. */
     std::shared_ptr<bool> released{};
 
 protected:
@@ -44,8 +44,8 @@ private:
 };
 
 /**
- * An encapsulated object: the handle that the provider sees and what it stands for. After a release the content is
- * gone; the handle stays, pointing to nothing, until the request ends, so that a use after release is told, not fatal.
+ * An encapsulated object: the handle that providers use, and its content. A release destroys the content. The handle
+ * remains until the request ends, so that a use after the release is reported as an error.
  */
 template <class Handle>
 class Encapsulated final : public Object {
@@ -55,7 +55,7 @@ public:
 
     Encapsulated(Arena& itsOwner, const FunctionTables& tables, Content initial)
         : Object(itsOwner, Traits<Handle>::kind),
-          // The standard's handles point to tables without const; nobody writes to them.
+          // CMPI's handles point to tables without const, but callers do not write to them.
           handle{static_cast<Object*>(this), const_cast<Table*>(&(tables.*Traits<Handle>::table))},
           content(std::move(initial)) {}
 
@@ -69,7 +69,7 @@ public:
     std::optional<Content> content;
 };
 
-/** The object behind a handle; null when the handle is null, released or of another kind. */
+/** The object of a handle; null if the handle is null, released or of another kind. */
 template <class Handle>
 Encapsulated<Handle>* objectOf(const Handle* handle) {
     if (handle == nullptr || handle->hdl == nullptr) {

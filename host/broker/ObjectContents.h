@@ -16,16 +16,16 @@
 
 namespace cimhost {
 
-/** What an encapsulated object can be. */
+/** The kinds of encapsulated objects. */
 enum class ObjectKind { string, objectPath, instance, dateTime, array, enumeration, args, context, result, error };
 
 /** Content of a CMPIInstance. */
 struct InstanceContent {
     Instance value{};
-    std::shared_ptr<const ClassInfo> classInfo{};  ///< null when the class is not known
+    std::shared_ptr<const ClassInfo> classInfo{};  ///< null if the class is unknown
     PropertyList accepted{};                       ///< the property filter; none accepts every property
-    bool filtersKeys = false;                      ///< whether the filter is one for keys, too
-    std::size_t given = 0;                         ///< how many properties, all at the front, the broker put in itself
+    bool filtersKeys = false;                      ///< whether the filter also applies to keys
+    std::size_t initialCount = 0;                  ///< number of properties, all at the front, that the broker added
 };
 
 /** Content of a CMPIArray: elements of one type. */
@@ -34,11 +34,11 @@ struct ArrayContent {
     std::vector<Scalar> elements{};
 };
 
-/** Content of a CMPIEnumeration: elements of one type, and how many of them were taken. */
+/** Content of a CMPIEnumeration: elements of one type, and the number of those that getNext returned. */
 struct EnumerationContent {
     CMPIType type = CMPI_null;
     std::vector<Scalar> elements{};
-    std::size_t taken = 0;
+    std::size_t position = 0;
 };
 
 /** Content of a CMPIArgs. */
@@ -51,21 +51,21 @@ struct ContextContent {
     std::vector<NamedValue> entries{};
 };
 
-/** What a result insists on. What it refuses is answered with an error and does not become an event. */
+/** Calls that a result rejects with an error. They do not become events. */
 struct ResultRules {
     bool refusesInstances = false;
-    bool refusesToBeEmpty = false;  ///< returnDone before anything was returned
-    bool keepsPaths = false;        ///< paths that were returned must not be released by the provider
+    bool refusesToBeEmpty = false;  ///< returnDone before any result
+    bool keepsPaths = false;        ///< the provider must not release the paths that it returned
 };
 
-/** Content of a CMPIResult: where the events go. They belong to who runs the request. */
+/** Content of a CMPIResult: the events, which are owned by the caller of the request. */
 struct ResultContent {
     ResultEvents* events = nullptr;
     ResultRules rules{};
-    std::shared_ptr<bool> pathReleased{};  ///< true once such a path was released; null while none was returned
+    std::shared_ptr<bool> pathReleased{};  ///< whether such a path was released; null: none was returned
 };
 
-/** What the broker knows of a handle type: its content, its kind, its name and its table. */
+/** The content, kind and function table of a handle type. */
 template <class Handle>
 struct Traits;
 

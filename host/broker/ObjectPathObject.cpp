@@ -8,10 +8,10 @@ namespace cimhost {
 namespace {
 
 template <std::string ObjectPath::*part>
-CMPIStatus setPart(CMPIObjectPath* path, const char* text) {
+CMPIStatus setPart(CMPIObjectPath* path, const char* value) {
     return guarded([&] {
         std::string& target = content(path).*part;
-        target = argument(text);
+        target = argument(value);
     });
 }
 
@@ -40,8 +40,8 @@ CMPIData asKey(CMPIData data) {
     return data;
 }
 
-/** A key without a value, as some object managers pass to providers, is counted; who asks for it is told so. */
-CMPIData toldIfNull(const CMPIData& data, CMPIStatus* rc) {
+/** Sets the status of a null key, which some object managers pass to providers. */
+CMPIData withNullStatus(const CMPIData& data, CMPIStatus* rc) {
     if (rc != nullptr && rc->rc == CMPI_RC_OK && (data.state & CMPI_nullValue) != 0) {
         rc->rc = CMPI_RC_ERR_NOT_FOUND;
     }
@@ -53,7 +53,7 @@ CMPIData getKey(const CMPIObjectPath* path, const char* name, CMPIStatus* rc) {
         const auto& object = self(path);
         return asKey(namedData(object.content->keys, name, arenaFor(object)));
     });
-    return toldIfNull(data, rc);
+    return withNullStatus(data, rc);
 }
 
 CMPIData getKeyAt(const CMPIObjectPath* path, CMPICount index, CMPIString** name, CMPIStatus* rc) {
@@ -61,7 +61,7 @@ CMPIData getKeyAt(const CMPIObjectPath* path, CMPICount index, CMPIString** name
         const auto& object = self(path);
         return asKey(namedDataAt(object.content->keys, index, name, arenaFor(object)));
     });
-    return toldIfNull(data, rc);
+    return withNullStatus(data, rc);
 }
 
 CMPICount getKeyCount(const CMPIObjectPath* path, CMPIStatus* rc) {
@@ -87,7 +87,7 @@ CMPIStatus setHostAndNameSpaceFromObjectPath(CMPIObjectPath* path, const CMPIObj
     });
 }
 
-// Qualifiers are not served: the broker's capabilities say so.
+// Qualifiers are not supported, as the broker's capabilities state.
 
 CMPIData noQualifier(const CMPIObjectPath* path, CMPIStatus* rc) {
     return guarded(rc, badData(), [&]() -> CMPIData {

@@ -2,6 +2,8 @@
 
 #include <cstring>
 
+#include "cim/CmpiAccess.h"
+
 namespace cimhost {
 
 RequestScope::RequestScope(Broker& itsBroker) : broker(itsBroker), objects(itsBroker.tables(), &itsBroker.lasting()) {
@@ -33,25 +35,12 @@ bool RequestScope::isPathReleased(const CMPIResult* result) {
     return object != nullptr && object->content->pathReleased != nullptr && *object->content->pathReleased;
 }
 
-namespace {
-
-/** Through its table: a message need not be one of this broker's strings. */
-std::string textOf(const CMPIString* message) {
-    if (message == nullptr || message->ft == nullptr || message->ft->getCharPtr == nullptr) {
-        return {};
-    }
-    const char* text = message->ft->getCharPtr(message, nullptr);
-    return text == nullptr ? "" : text;
-}
-
-}  // namespace
-
 Status statusFrom(const CMPIStatus& status) {
-    // Read as the number that it is: an enumeration must not be loaded with a value that it cannot have.
+    // Copy the bytes: reading a value that the enumeration does not have is undefined behaviour.
     static_assert(sizeof status.rc == sizeof(int));
     int rc = CMPI_RC_OK;
     std::memcpy(&rc, &status.rc, sizeof rc);
-    return {rc, textOf(status.msg)};
+    return {rc, cim::charactersOf(status.msg).value_or(std::string{})};
 }
 
 }  // namespace cimhost

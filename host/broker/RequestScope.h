@@ -8,8 +8,8 @@
 namespace cimhost {
 
 /**
- * One request on this thread: while it lives, what providers make through the broker belongs to it, and it frees all
- * of it in the end. Scopes nest, for requests that come out of requests; they end in reverse order.
+ * Owns the objects that providers create on this thread during one request. Scopes can be nested, for requests that
+ * providers send, and are destroyed in reverse order.
  */
 class RequestScope {
 public:
@@ -19,20 +19,20 @@ public:
     RequestScope& operator=(const RequestScope&) = delete;
 
     /** @name Objects for the request's provider
-     * Made from plain values; they live as long as the scope.
+     * Created from plain values; valid for the lifetime of the scope.
      */
     ///@{
     CMPIContext* context(const ContextEntries& entries);
     CMPIObjectPath* objectPath(const ObjectPath& path);
     CMPIInstance* instance(const Instance& instance);
 
-    /** @param events receives what the provider returns; must live as long as the scope */
+    /** @param events receives the results of the provider; must outlive the scope */
     CMPIResult* result(ResultEvents& events, const ResultRules& rules = {});
     ///@}
 
     Arena& arena() { return objects; }
 
-    /** Whether the provider released a path that such a result keeps. */
+    /** Whether the provider released a path that the result keeps (ResultRules::keepsPaths). */
     static bool isPathReleased(const CMPIResult* result);
 
 private:
@@ -40,7 +40,7 @@ private:
     Arena objects;
 };
 
-/** A status as a provider answers it, with the text of its message; empty when there is none or it cannot be had. */
+/** Converts a provider's status. The message is empty if there is none or it cannot be read. */
 Status statusFrom(const CMPIStatus& status);
 
 }  // namespace cimhost

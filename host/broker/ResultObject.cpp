@@ -9,7 +9,7 @@ ResultEvents& events(const CMPIResult* result) {
     return *content(result).events;
 }
 
-/** Records a null pointer before argument() refuses it. */
+/** Records a null pointer before argument() rejects it. */
 template <class Handle>
 void recordNull(const ResultContent& target, const Handle* returned) {
     if (returned == nullptr) {
@@ -24,7 +24,7 @@ void noticeRelease(ResultContent& result, const CMPIObjectPath* path) {
     objectOf(path)->released = result.pathReleased;
 }
 
-/** What a result collects belongs to its request, so nothing of it can outlive that. */
+/** The events of a result belong to its request and must not outlive it. */
 CMPIResult* cloneResult(const CMPIResult* result, CMPIStatus* rc) {
     return guarded<CMPIResult*>(rc, nullptr, [&]() -> CMPIResult* {
         self(result);

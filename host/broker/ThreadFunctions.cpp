@@ -10,7 +10,7 @@
 
 #include "broker/FunctionTables.h"
 
-// CMPIBrokerExtFT: threads, mutexes and conditions of POSIX, by handles that the provider owns.
+// CMPIBrokerExtFT: POSIX threads, mutexes and conditions.
 
 namespace cimhost {
 namespace {
@@ -26,7 +26,7 @@ pthread_t threadOf(void* handle) {
     return reinterpret_cast<pthread_t>(handle);
 }
 
-/** @return "lib<name>.so", to be freed with free(); null for no name or without memory */
+/** @return "lib<name>.so", to be freed with free(); null if the name is null, or if out of memory */
 char* resolveFileName(const char* name) {
     if (name == nullptr) {
         return nullptr;

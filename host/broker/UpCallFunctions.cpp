@@ -3,12 +3,12 @@
 #include "broker/ErrorTranslation.h"
 #include "broker/FunctionTables.h"
 
-// CMPIBrokerFT: what providers ask the object manager for. Each function makes a Request for UpCalls.
+// CMPIBrokerFT: requests of providers to the object manager. Each function passes a Request to UpCalls.
 
 namespace cimhost {
 namespace {
 
-/** The entries of the caller's context; none for a caller that has no context. */
+/** The entries of the caller's context; none if it is null. */
 const ContextEntries& entriesOf(const CMPIContext* context) {
     static const ContextEntries none;
     return context == nullptr ? none : argument(context).entries;
@@ -18,7 +18,7 @@ std::optional<std::string> optionalName(const char* name) {
     return name == nullptr ? std::nullopt : std::optional<std::string>(name);
 }
 
-/** Performs the request in the caller's context. Failure with the status of the response if it is not OK. */
+/** Performs a request in the caller's context. @throws Failure with the status of the response if it is not OK */
 Response performed(Broker& broker, const CMPIContext* context, Request request) {
     request.context = entriesOf(context);
     Response response = broker.upCalls().perform(std::move(request));
@@ -38,7 +38,7 @@ CMPIEnumeration* enumerationOf(Broker& broker, CMPIType type, std::vector<Kind> 
     return broker.arena().make<CMPIEnumeration>(std::move(content));
 }
 
-/** Performs a request that makeRequest() returns; its results, instances or paths, become an enumeration. */
+/** Performs the request that makeRequest() returns. @return its results, instances or paths */
 template <class MakeRequest>
 CMPIEnumeration* enumerated(const CMPIBroker* handle, const CMPIContext* context, CMPIStatus* rc,
                             MakeRequest makeRequest) {
@@ -52,9 +52,9 @@ CMPIEnumeration* enumerated(const CMPIBroker* handle, const CMPIContext* context
     });
 }
 
-/** The only result of a response. Failure with CMPI_RC_ERR_FAILED if there is none. */
+/** The first result of a response. @throws Failure with CMPI_RC_ERR_FAILED if there is none */
 template <class Kind>
-Kind onlyOne(std::vector<Kind>& results) {
+Kind firstOf(std::vector<Kind>& results) {
     if (results.empty()) {
         throw Failure(CMPI_RC_ERR_FAILED, "The object manager returned no result.");
     }
@@ -106,7 +106,7 @@ CMPIInstance* getInstance(const CMPIBroker* handle, const CMPIContext* context, 
         Broker& broker = Broker::of(handle);
         Response response =
             performed(broker, context, Request::getInstance(argument(path), propertyListFrom(properties)));
-        return broker.arena().make<CMPIInstance>({onlyOne(response.instances), nullptr, {}});
+        return broker.arena().make<CMPIInstance>({firstOf(response.instances), nullptr, {}});
     });
 }
 
@@ -116,7 +116,7 @@ CMPIObjectPath* createInstance(const CMPIBroker* handle, const CMPIContext* cont
         Broker& broker = Broker::of(handle);
         Response response =
             performed(broker, context, Request::createInstance(argument(path), argument(instance).value));
-        return broker.arena().make<CMPIObjectPath>(onlyOne(response.paths));
+        return broker.arena().make<CMPIObjectPath>(firstOf(response.paths));
     });
 }
 

@@ -4,7 +4,7 @@
 #include "broker/FunctionTables.h"
 #include "broker/NamedValues.h"
 
-// The encapsulated objects that only hold values: strings, datetimes, arrays, enumerations, arguments, contexts.
+// The encapsulated objects that contain only values: strings, datetimes, arrays, enumerations, arguments, contexts.
 
 namespace cimhost {
 namespace {
@@ -20,10 +20,10 @@ const char* getCharPtr(const CMPIString* string, CMPIStatus* rc) {
 
 // CMPIDateTime.
 
-/** A time before 1970 comes as the two's complement of the microseconds until then. */
+/** A time before 1970 is returned as the two's complement of a negative number. */
 CMPIUint64 getBinaryFormat(const CMPIDateTime* time, CMPIStatus* rc) {
     return guarded<CMPIUint64>(rc, 0, [&] {
-        const std::optional<std::int64_t> binary = microseconds(content(time).text);
+        const std::optional<std::int64_t> binary = microsecondsOf(content(time).value);
         if (!binary) {
             throw Failure(CMPI_RC_ERR_FAILED, "A datetime with unknown fields has no binary form.");
         }
@@ -34,18 +34,18 @@ CMPIUint64 getBinaryFormat(const CMPIDateTime* time, CMPIStatus* rc) {
 CMPIString* getStringFormat(const CMPIDateTime* time, CMPIStatus* rc) {
     return guarded<CMPIString*>(rc, nullptr, [&] {
         const auto& object = self(time);
-        return arenaFor(object).make<CMPIString>(object.content->text);
+        return arenaFor(object).make<CMPIString>(object.content->value);
     });
 }
 
 CMPIBoolean isIntervalTime(const CMPIDateTime* time, CMPIStatus* rc) {
     return guarded<CMPIBoolean>(rc, 0,
-                                [&] { return static_cast<CMPIBoolean>(isInterval(content(time).text) ? 1 : 0); });
+                                [&] { return static_cast<CMPIBoolean>(isIntervalForm(content(time).value) ? 1 : 0); });
 }
 
 // CMPIArray.
 
-/** The element at that position. Failure with CMPI_RC_ERR_NO_SUCH_PROPERTY when there is none. */
+/** @throws Failure with CMPI_RC_ERR_NO_SUCH_PROPERTY if there is no such element */
 Scalar& elementAt(ArrayContent& array, CMPICount index) {
     if (index >= array.elements.size()) {
         throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY);
@@ -85,21 +85,21 @@ CMPIData getNext(const CMPIEnumeration* enumeration, CMPIStatus* rc) {
     return guarded(rc, badData(), [&] {
         auto& object = self(enumeration);
         EnumerationContent& from = *object.content;
-        if (from.taken >= from.elements.size()) {
+        if (from.position >= from.elements.size()) {
             throw Failure(CMPI_RC_ERR_FAILED, "The enumeration has no more elements.");
         }
-        return dataFrom(from.elements[from.taken++], from.type, arenaFor(object));
+        return dataFrom(from.elements[from.position++], from.type, arenaFor(object));
     });
 }
 
 CMPIBoolean hasNext(const CMPIEnumeration* enumeration, CMPIStatus* rc) {
     return guarded<CMPIBoolean>(rc, 0, [&] {
         const EnumerationContent& from = content(enumeration);
-        return static_cast<CMPIBoolean>(from.taken < from.elements.size() ? 1 : 0);
+        return static_cast<CMPIBoolean>(from.position < from.elements.size() ? 1 : 0);
     });
 }
 
-/** All elements, also those taken already; the enumeration stays where it is. */
+/** Returns all elements, also those that getNext returned, and does not change the position. */
 CMPIArray* toArray(const CMPIEnumeration* enumeration, CMPIStatus* rc) {
     return guarded<CMPIArray*>(rc, nullptr, [&] {
         const auto& object = self(enumeration);

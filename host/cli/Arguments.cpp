@@ -16,8 +16,8 @@ constexpr auto introduction =
     "Providers come from registration files in SFCB's form, classes from MOF files.";
 
 constexpr auto examples =
-    R"(Object paths are WBEM URIs: [namespace:]Class[.Key=value,...]. String keys stand in quotation marks, which
-a shell keeps only inside of quotes:
+    R"(Object paths are WBEM URIs: [namespace:]Class[.Key=value,...]. Write string keys in quotation marks, and the
+whole path in the quotes of your shell:
 
   cimhost ei Some_Class
   cimhost gi 'Some_Class.InstanceID="1"'
@@ -29,15 +29,15 @@ a shell keeps only inside of quotes:
 
 constexpr auto closing =
     R"(
-Environment: CIMHOST_SCHEMA, CIMHOST_REGISTRATION and CIMHOST_LIBRARY_PATH hold files or directories, separated
-by colons, for what the options do not name.
+Environment: CIMHOST_SCHEMA, CIMHOST_REGISTRATION and CIMHOST_LIBRARY_PATH are lists of files or directories,
+separated by colons, that replace options which are not given.
 
-Exit status: 0 success, 1 the request was answered with an error, 2 wrong usage, 3 a library, registration or
-schema cannot be loaded, 4 the output cannot be written.)";
+Exit status: 0 success, 1 the request failed, 2 wrong command line, 3 a library, registration or schema cannot be
+loaded, 4 the output cannot be written.)";
 
 enum class Target { none, className, objectPath };
 
-/** Options of a command; they can be combined. */
+/** Groups of options that a command has. */
 enum CommandOptions : unsigned {
     plain = 0,
     assigns = 1,     ///< NAME=VALUE, --null
@@ -92,7 +92,7 @@ void addCommonOptions(CLI::App& app, Arguments& arguments) {
     app.add_option("--library-path", arguments.libraryPaths, "Directory with provider libraries (repeatable)")
         ->type_name("DIR")
         ->allow_extra_args(false);
-    app.add_option("--namespace", arguments.nameSpace, "Namespace of paths that name none")
+    app.add_option("--namespace", arguments.nameSpace, "Namespace of paths without one")
         ->type_name("NAME")
         ->capture_default_str();
     addChoice<Format>(app, "--format", "Form of the output: text (default), json or mof", arguments.format,
@@ -103,7 +103,7 @@ void addCommonOptions(CLI::App& app, Arguments& arguments) {
         {{"auto", text::Colours::automatic}, {"always", text::Colours::always}, {"never", text::Colours::never}})
         ->type_name("WHEN");
     app.add_flag("--raw", arguments.raw,
-                 "Show exactly what the provider did: its status, each object it returned, its calls of returnDone");
+                 "Show the provider's own response: its status, its results, its calls of returnDone");
 }
 
 void addCommand(CLI::App& app, const Command& command, Arguments& arguments) {
@@ -120,7 +120,7 @@ void addCommand(CLI::App& app, const Command& command, Arguments& arguments) {
         sub->add_option("PATH", arguments.target, "Object path, [namespace:]Class.Key=value,...")->required();
     }
     if ((command.options & assigns) != 0) {
-        sub->add_option("NAME=VALUE", arguments.assignments, "Value for a property; NAME= is the empty string");
+        sub->add_option("NAME=VALUE", arguments.assignments, "Value of a property; NAME= is the empty string");
         sub->add_option("--null", arguments.nulls, "Set this property to null (repeatable)")
             ->type_name("NAME")
             ->allow_extra_args(false);
@@ -132,17 +132,17 @@ void addCommand(CLI::App& app, const Command& command, Arguments& arguments) {
     }
     if ((command.options & refers) != 0) {
         sub->add_option("--result-class", arguments.filter.resultClass, "Class of the results")->type_name("CLASS");
-        sub->add_option("--role", arguments.filter.role, "Role of the instance given")->type_name("NAME");
+        sub->add_option("--role", arguments.filter.role, "Role of the given instance")->type_name("NAME");
     }
     if ((command.options & lists) != 0) {
-        sub->add_option("--property", arguments.properties, "Ask for this property only (repeatable)")
+        sub->add_option("--property", arguments.properties, "Request only this property (repeatable)")
             ->type_name("NAME")
             ->allow_extra_args(false);
     }
     sub->callback([&arguments, &command] { arguments.operation = command.operation; });
 }
 
-/** All known names of commands and options. */
+/** The names of all commands and options. */
 std::vector<std::string> wordsOf(const CLI::App& app) {
     std::vector<std::string> words;
     for (const CLI::App* command : app.get_subcommands([](const CLI::App*) { return true; })) {
@@ -156,16 +156,17 @@ std::vector<std::string> wordsOf(const CLI::App& app) {
     return words;
 }
 
-/** The message for a word that is neither a command nor an option, with the nearest one that is. */
-std::string unknownText(const CLI::App& app, const std::string& word) {
+/** The message for an unknown command or option, with the most similar known one. */
+std::string unknownMessage(const CLI::App& app, const std::string& word) {
     const std::vector<CLI::App*> used = app.get_subcommands();
     const std::string command = used.empty() ? "" : used.front()->get_name() + " ";
-    const std::string what = used.empty() ? "there is no command or option " + word : command + "takes no " + word;
-    return what + didYouMean(word, wordsOf(app)) + "\nRun " + app.get_name() + " " + command +
-           "--help for what there is.";
+    const std::string reason =
+        used.empty() ? "there is no command or option " + word : command + "does not take " + word;
+    return reason + didYouMean(word, wordsOf(app)) + "\nRun " + app.get_name() + " " + command +
+           "--help for commands and options.";
 }
 
-/** Fills in the output of a program that ends with its help, its version or a usage error. */
+/** Sets the output of a program that ends with its help, its version or a usage error. */
 void end(ParsedArguments& parsed, const CLI::App& app, const CLI::ParseError& error) {
     std::ostringstream output;
     std::ostringstream problem;
@@ -177,7 +178,7 @@ void end(ParsedArguments& parsed, const CLI::App& app, const CLI::ParseError& er
     }
     const std::vector<std::string> unknown = app.remaining(true);
     const bool isUnknown = dynamic_cast<const CLI::ExtrasError*>(&error) != nullptr || app.get_subcommands().empty();
-    parsed.error = isUnknown && !unknown.empty() ? unknownText(app, unknown.front()) : problem.str();
+    parsed.error = isUnknown && !unknown.empty() ? unknownMessage(app, unknown.front()) : problem.str();
     parsed.error.erase(parsed.error.find_last_not_of('\n') + 1);
 }
 

@@ -16,16 +16,16 @@ namespace cimhost {
 
 enum class Format { text, json, mof };
 
-/** What a program adds to the command line of cimhost; cimhost itself adds nothing. */
+/** Additions of a program to the command line of cimhost. */
 struct CommandLineExtension {
     std::string program = "cimhost";
     std::string introduction{};              ///< first paragraph of the help; empty: that of cimhost
-    std::string examples{};                  ///< further lines of examples, each ending with a line feed
-    std::string notes{};                     ///< a paragraph after the examples, ending with a line feed; empty: none
+    std::string examples{};                  ///< more lines of examples, each with a line feed
+    std::string notes{};                     ///< a paragraph after the examples, with a line feed; empty: none
     std::function<void(CLI::App&)> addTo{};  ///< adds options and commands; may be empty
 };
 
-/** The command line. */
+/** The options and arguments of a command line. */
 struct Arguments {
     std::optional<Operation> operation{};    ///< none: list the classes, or a command of the extension
     std::string target{};                    ///< class name or object path; empty for classes
@@ -40,16 +40,16 @@ struct Arguments {
     Format format = Format::text;
     bool raw = false;
     text::Colours colours = text::Colours::automatic;
-    text::Style style{};  ///< for people, on standard output
+    text::Style style{};  ///< of text on standard output
 };
 
-/** The result of reading a command line: arguments, or output and exit status of a program that ends at once. */
+/** The arguments of a command line, or the output and exit status of a program that ends without a command. */
 struct ParsedArguments {
     Arguments arguments{};
-    bool ended = false;    ///< for --help and --version, and if the command line is wrong
-    int exitStatus = 0;    ///< when ended
-    std::string output{};  ///< for standard output, when ended
-    std::string error{};   ///< for standard error, when ended
+    bool ended = false;    ///< after --help, --version, or an error of the command line
+    int exitStatus = 0;    ///< if ended
+    std::string output{};  ///< for standard output, if ended
+    std::string error{};   ///< for standard error, if ended
 };
 
 ParsedArguments parseArguments(int count, const char* const* values, const CommandLineExtension& extension);

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "cim/Names.h"
 #include "cli/ExitStatus.h"
 #include "cli/Output.h"
 #include "cli/RequestBuilder.h"
@@ -84,7 +85,7 @@ std::string formattedRaw(const Response& response, const Arguments& arguments) {
                                             : text::format(response.providers, arguments.style);
 }
 
-/** The status of the providers themselves: OK also if the object manager makes an error of what they returned. */
+/** The status of the providers: OK also if the object manager maps their results to an error. */
 Status rawStatus(const Response& response) {
     const auto hasSucceeded = [](const ProviderResponse& each) { return each.status.ok() && each.crashReason.empty(); };
     const bool haveAll = std::all_of(response.providers.begin(), response.providers.end(), hasSucceeded);
@@ -101,11 +102,11 @@ std::string hintFor(int code, const Request& request, const std::vector<Provider
     }
     switch (code) {
         case CMPI_RC_ERR_INVALID_CLASS:
-            return "Run cimhost classes for those that are served" + didYouMean(className, names);
+            return "Run cimhost classes to list the classes" + didYouMean(className, names);
         case CMPI_RC_ERR_INVALID_NAMESPACE:
-            return "Run cimhost classes for where each class is served; --namespace names another.";
+            return "Run cimhost classes to list the namespaces of each class, and choose one with --namespace.";
         case CMPI_RC_ERR_NOT_FOUND:
-            return "Run cimhost enumerate-instance-names " + request.path.className + " for those that there are.";
+            return "Run cimhost enumerate-instance-names " + request.path.className + " to list the instances.";
         default:
             return "";
     }
@@ -130,14 +131,14 @@ CommandResult runRequest(const Arguments& arguments, const SearchPaths& paths, c
     }
 }
 
-/** All classes of the schema in its order, then those that are only registered, each with its providers. */
+/** All classes of the schema in order, then those that are only registered, each with its providers. */
 std::vector<ListedClass> listClasses(const Schema& schema, const std::vector<ProviderRegistration>& registrations) {
     std::vector<ListedClass> list;
     for (const Class* each : schema.classes()) {
         list.push_back({each->name, each});
     }
     for (const ProviderRegistration& registration : registrations) {
-        const auto same = [&](const ListedClass& each) { return sameName(each.name, registration.className); };
+        const auto same = [&](const ListedClass& each) { return cim::sameName(each.name, registration.className); };
         auto listed = std::find_if(list.begin(), list.end(), same);
         if (listed == list.end()) {
             listed = list.insert(list.end(), {registration.className});
@@ -151,7 +152,7 @@ std::vector<ListedClass> listClasses(const Schema& schema, const std::vector<Pro
 
 CommandResult runCommand(const Arguments& arguments, CommandExtension& extension) {
     if (arguments.format == Format::mof && (arguments.raw || !arguments.operation)) {
-        throw UsageError("--format mof shows instances; use text or json for everything else");
+        throw UsageError("--format mof shows only instances; use text or json");
     }
     const SearchPaths paths = findSearchPaths(arguments);
     const Schema schema = readSchema(paths);

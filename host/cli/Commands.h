@@ -10,15 +10,15 @@
 
 namespace cimhost {
 
-/** The result of a command: output for standard output, and the status of its request. */
+/** The result of a command. */
 struct CommandResult {
-    std::string output{};
-    Status status{};
-    std::string failure{};  ///< message for standard error although the request was OK; empty: none
-    std::string hint{};     ///< what to try after a failed request; empty: nothing
+    std::string output{};   ///< for standard output
+    Status status{};        ///< of the request
+    std::string failure{};  ///< message for standard error if the status is OK; empty: none
+    std::string hint{};     ///< what to do after a failed request; empty: none
 };
 
-/** How a program runs its commands; cimhost itself uses the defaults. */
+/** Additions of a program to the commands of cimhost. */
 class CommandExtension {
 public:
     virtual ~CommandExtension() = default;
@@ -26,10 +26,10 @@ public:
     /** Null: the standard behaviour. */
     virtual std::shared_ptr<const ManagerBehaviour> behaviour() const { return nullptr; }
 
-    /** Changes a request as the clients of the emulated manager would. */
+    /** Changes a request into one that a client of the emulated manager would send. */
     virtual void adapt(Request&) const {}
 
-    /** Whether a command was given that the program adds to those of cimhost. */
+    /** Whether the command line has a command that the program adds. */
     virtual bool hasCommand() const { return false; }
 
     /** Runs that command. */
@@ -38,7 +38,8 @@ public:
 
 /**
  * Runs the command of a command line: loads schema and registrations, performs the request, unloads the providers.
- * UsageError, ValueError and PathError for a wrong command line, LoadError and LibraryError for what cannot be loaded.
+ * @throws UsageError, ValueError, PathError for a wrong command line
+ * @throws LoadError, LibraryError for files that cannot be loaded
  */
 CommandResult runCommand(const Arguments& arguments, CommandExtension& extension);
 

@@ -4,16 +4,16 @@
 
 namespace cimhost {
 
-/** What the program tells the shell. */
+/** Exit statuses of the program. */
 enum ExitStatus {
     exitSuccess = 0,
-    exitCimError = 1,  ///< the request was answered with an error
+    exitCimError = 1,  ///< the request failed
     exitUsage = 2,     ///< the command line is wrong
     exitLoad = 3,      ///< a library, a registration or a schema cannot be loaded
     exitOutput = 4     ///< the output could not be written
 };
 
-/** A command line that cannot be obeyed; the text says what to write instead. */
+/** A wrong command line. The message says what to write instead. */
 class UsageError : public std::runtime_error {
 public:
     using std::runtime_error::runtime_error;

@@ -2,10 +2,10 @@
 
 #include <nlohmann/json.hpp>
 
+#include "cim/Utf8.h"
 #include "operations/StatusText.h"
 #include "schema/CimType.h"
 #include "schema/ObjectPathText.h"
-#include "schema/Text.h"
 
 namespace cimhost::json {
 namespace {
@@ -18,11 +18,11 @@ Json instanceJson(const Instance& instance);
 struct ScalarJson {
     Json operator()(std::monostate) const { return nullptr; }
     Json operator()(Char16 value) const {
-        std::string text;
-        appendUtf8(text, value.code);
-        return text;
+        std::string character;
+        cim::appendUtf8(character, value.code);
+        return character;
     }
-    Json operator()(const DateTime& value) const { return value.text; }
+    Json operator()(const DateTime& value) const { return value.value; }
     Json operator()(const std::shared_ptr<const ObjectPath>& value) const {
         return value ? pathJson(*value) : Json(nullptr);
     }
@@ -82,8 +82,8 @@ Json listJson(const std::vector<Item>& items, Convert convert) {
     return list;
 }
 
-Json textOrNull(const std::string& text) {
-    return text.empty() ? Json(nullptr) : Json(text);
+Json stringOrNull(const std::string& string) {
+    return string.empty() ? Json(nullptr) : Json(string);
 }
 
 struct EventJson {
@@ -107,24 +107,24 @@ Json responseJson(const ProviderResponse& response) {
     for (const ResultEvent& event : response.events) {
         returned.push_back(std::visit(EventJson{}, event));
     }
-    const bool hasText = response.hasMessage || response.threw;
+    const bool hasMessage = response.hasMessage || response.threw;
     return {{"status",
              {{"code", static_cast<int>(response.status.rc)},
               {"name", codeName(response.status.rc)},
-              {"message", hasText ? Json(response.status.message) : Json(nullptr)}}},
+              {"message", hasMessage ? Json(response.status.message) : Json(nullptr)}}},
             {"exception", response.threw},
             {"returned", returned},
             {"returnDoneCount", response.doneCount()}};
 }
 
 Json providerJson(const ProviderRegistration& provider) {
-    return {{"provider", provider.provider},         {"location", provider.location},
-            {"instance", provider.instance},         {"association", provider.association},
-            {"namespaces", provider.nameSpaces},     {"group", textOrNull(provider.group)},
-            {"unload", textOrNull(provider.unload)}, {"source", provider.source}};
+    return {{"provider", provider.provider},           {"location", provider.location},
+            {"instance", provider.instance},           {"association", provider.association},
+            {"namespaces", provider.nameSpaces},       {"group", stringOrNull(provider.group)},
+            {"unload", stringOrNull(provider.unload)}, {"source", provider.source}};
 }
 
-/** The value of the qualifier of that name; null without one. Works for classes and properties. */
+/** The value of a qualifier of a class or property; null if it has none. */
 template <typename Qualified>
 Json qualifierJson(const Qualified& qualified, const char* name) {
     const Qualifier* qualifier = qualified.findQualifier(name);
@@ -135,7 +135,7 @@ Json propertyJson(const Property& property) {
     return {{"name", property.name},
             {"type", typeName(property.type)},
             {"array", property.isArray},
-            {"referenceClass", textOrNull(property.referenceClass)},
+            {"referenceClass", stringOrNull(property.referenceClass)},
             {"key", property.isKey()},
             {"writable", property.isWritable()},
             {"description", qualifierJson(property, "Description")}};
@@ -147,7 +147,7 @@ Json classJson(const ListedClass& listed) {
     const auto keyName = [](const Property* key) { return Json(key->name); };
     return {{"class", listed.name},
             {"inSchema", known},
-            {"superclass", known ? textOrNull(definition->superclass) : Json(nullptr)},
+            {"superclass", known ? stringOrNull(definition->superclass) : Json(nullptr)},
             {"association", known && definition->isAssociation()},
             {"description", known ? qualifierJson(*definition, "Description") : Json(nullptr)},
             {"keys", known ? listJson(definition->keys(), keyName) : Json::array()},

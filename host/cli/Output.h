@@ -13,13 +13,13 @@ namespace cimhost {
 /** A class and its providers. */
 struct ListedClass {
     std::string name{};
-    const Class* definition = nullptr;  ///< null for a class that is registered but not in the schema
+    const Class* definition = nullptr;  ///< null if the schema does not contain the class
     std::vector<ProviderRegistration> providers{};
 };
 
 }  // namespace cimhost
 
-/** Output for people. Control characters in data are escaped, so that they cannot steer a terminal. */
+/** Output for people. Control characters in data are escaped, so that they do not control the terminal. */
 namespace cimhost::text {
 
 /** The path, then one line per property: name, type, value. Instances are separated by an empty line. */
@@ -28,7 +28,7 @@ std::string format(const std::vector<Instance>& instances, const Style& style);
 /** One path per line. */
 std::string format(const std::vector<ObjectPath>& paths, const Style& style);
 
-/** Per provider: its status, everything that it returned, numbered, and how often it called returnDone. */
+/** Per provider: its status, its results, numbered, and the number of calls of returnDone. */
 std::string format(const std::vector<ProviderResponse>& responses, const Style& style);
 
 /** One line per class and provider: class, interfaces, provider, library, namespaces. */
@@ -37,9 +37,9 @@ std::string format(const std::vector<ListedClass>& classes, const Style& style);
 }  // namespace cimhost::text
 
 /**
- * Output for programs, one JSON document with a line feed at the end. Properties and keys stay in their order; each
- * has its CIM type, whether it is an array, and its value, null where it is null. Bytes that are no UTF-8 become
- * U+FFFD. docs/cimhost.md shows the shapes.
+ * Output for programs: a JSON document with a line feed at the end. Properties and keys are in order; each has its CIM
+ * type, whether it is an array, and its value. Bytes that are not UTF-8 become U+FFFD. docs/cimhost.md shows the
+ * format.
  */
 namespace cimhost::json {
 

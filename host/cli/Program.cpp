@@ -20,17 +20,17 @@ class Console {
 public:
     Console(std::string itsProgram, text::Style itsStyle) : program(std::move(itsProgram)), style(itsStyle) {}
 
-    void complain(const std::string& message) const {
+    void printError(const std::string& message) const {
         std::fprintf(stderr, "%s %s\n", text::painted(program + ":", text::Role::alarm, style).c_str(),
                      message.c_str());
     }
 
-    /** Writes to standard output, or reports why that fails. */
+    /** Writes to standard output. @return false after an error, which it reports */
     bool write(const std::string& output) const {
         const bool isWritten =
             std::fwrite(output.data(), 1, output.size(), stdout) == output.size() && std::fflush(stdout) == 0;
         if (!isWritten) {
-            complain(std::string("the output cannot be written: ") + std::strerror(errno));
+            printError(std::string("the output cannot be written: ") + std::strerror(errno));
         }
         return isWritten;
     }
@@ -46,14 +46,14 @@ int run(const Arguments& arguments, CommandExtension& commands, const Console& c
         return exitOutput;
     }
     if (!result.status.ok()) {
-        console.complain(errorText(result.status));
+        console.printError(errorText(result.status));
         if (!result.hint.empty()) {
             std::fprintf(stderr, "%s\n", result.hint.c_str());
         }
         return exitCimError;
     }
     if (!result.failure.empty()) {
-        console.complain(result.failure);
+        console.printError(result.failure);
         return exitCimError;
     }
     return exitSuccess;
@@ -63,23 +63,23 @@ int runGuarded(const Arguments& arguments, CommandExtension& commands, const Con
     try {
         return run(arguments, commands, console);
     } catch (const LoadError& error) {
-        console.complain(error.what());
+        console.printError(error.what());
         return exitLoad;
     } catch (const LibraryNotFound& error) {
-        console.complain(std::string(error.what()) +
-                         " (libraries are looked for with --library-path and CIMHOST_LIBRARY_PATH)");
+        console.printError(std::string(error.what()) +
+                           " (set --library-path or CIMHOST_LIBRARY_PATH to its directory)");
         return exitLoad;
     } catch (const LibraryError& error) {
-        console.complain(error.what());
+        console.printError(error.what());
         return exitLoad;
     } catch (const UsageError& error) {
-        console.complain(error.what());
+        console.printError(error.what());
     } catch (const PathError& error) {
-        console.complain(error.what());
+        console.printError(error.what());
     } catch (const ValueError& error) {
-        console.complain(error.what());
+        console.printError(error.what());
     } catch (const std::exception& error) {
-        console.complain(error.what());
+        console.printError(error.what());
         return exitCimError;
     }
     return exitUsage;
@@ -89,7 +89,7 @@ int runGuarded(const Arguments& arguments, CommandExtension& commands, const Con
 
 int runProgram(int count, const char* const* values, const CommandLineExtension& commandLine,
                CommandExtension& commands) {
-    std::signal(SIGPIPE, SIG_IGN);  // a closed pipe is an error to report, not a silent end
+    std::signal(SIGPIPE, SIG_IGN);  // report a closed pipe as an error
     ParsedArguments parsed = parseArguments(count, values, commandLine);
     const Console console(commandLine.program, text::styleFor(STDERR_FILENO, parsed.arguments.colours));
     parsed.arguments.style = text::styleFor(STDOUT_FILENO, parsed.arguments.colours);
@@ -97,7 +97,7 @@ int runProgram(int count, const char* const* values, const CommandLineExtension&
         return runGuarded(parsed.arguments, commands, console);
     }
     if (!parsed.error.empty()) {
-        console.complain(parsed.error);
+        console.printError(parsed.error);
     }
     return console.write(parsed.output) ? parsed.exitStatus : static_cast<int>(exitOutput);
 }

@@ -5,7 +5,7 @@
 
 namespace cimhost {
 
-/** Runs a program of cimhost's commands. @return its exit status */
+/** Runs cimhost with these additions. @return the exit status */
 int runProgram(int count, const char* const* values, const CommandLineExtension& commandLine,
                CommandExtension& commands);
 

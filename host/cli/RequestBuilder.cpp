@@ -9,12 +9,12 @@
 #include "schema/Literal.h"
 #include "schema/MofWriter.h"
 #include "schema/ObjectPathText.h"
-#include "schema/PropertyText.h"
+#include "schema/PropertyValue.h"
 
 namespace cimhost {
 namespace {
 
-bool namesAClass(Operation operation) {
+bool takesClass(Operation operation) {
     return operation == Operation::enumerateInstances || operation == Operation::enumerateInstanceNames;
 }
 
@@ -22,8 +22,8 @@ const Class& classOf(const ObjectPath& path, const Schema& schema) {
     const Class* known = schema.findClass(path.className);
     if (known == nullptr) {
         throw UnknownClass("class " + path.className +
-                           " is not in the schema, so its values have no types; name the MOF file that declares it "
-                           "with --schema");
+                           " is not in the schema, so the types of its properties are unknown; name the MOF file that "
+                           "declares it with --schema");
     }
     return *known;
 }
@@ -50,10 +50,10 @@ public:
     void assign(const std::string& assignment) {
         const std::size_t equals = assignment.find('=');
         if (equals == std::string::npos || equals == 0) {
-            throw UsageError(assignment + " is no NAME=VALUE; to set null, write --null NAME");
+            throw UsageError(assignment + " is not NAME=VALUE; to set null, write --null NAME");
         }
         const Property& property = propertyOf(known, assignment.substr(0, equals));
-        add({property.name, parsePropertyText(assignment.substr(equals + 1), property, schema, nameSpace)});
+        add({property.name, parsePropertyValue(assignment.substr(equals + 1), property, schema, nameSpace)});
     }
 
     void setNull(const std::string& name) {
@@ -90,7 +90,7 @@ std::vector<NamedValue> readValues(const Arguments& arguments, const ObjectPath&
     return std::move(reader.values);
 }
 
-/** Keys may be in the path, among the values, or in both; copies them to both, before the other values. */
+/** Copies each key from the path to the properties, before the others, or from the properties to the path. */
 void joinKeys(Request& request, const Schema& schema) {
     std::vector<NamedValue>& properties = request.instance.properties;
     const Class* known = schema.findClass(request.path.className);
@@ -144,8 +144,8 @@ Request buildRequest(const Arguments& arguments, const Schema& schema) {
     request.path = parseObjectPath(arguments.target, schema, arguments.nameSpace);
     request.properties = arguments.properties;
     request.filter = arguments.filter;
-    if (namesAClass(request.operation) && !request.path.keys.empty()) {
-        throw UsageError(arguments.target + " names an instance; name a class, or use get-instance");
+    if (takesClass(request.operation) && !request.path.keys.empty()) {
+        throw UsageError(arguments.target + " is the path of an instance; write a class, or use get-instance");
     }
     if (request.operation == Operation::createInstance || request.operation == Operation::modifyInstance) {
         addInstance(request, arguments, schema);

@@ -7,16 +7,16 @@
 
 namespace cimhost {
 
-/** Values are given for a class that the schema does not have. */
+/** The command line has values for a class that the schema does not contain. */
 class UnknownClass : public std::runtime_error {
 public:
     using std::runtime_error::runtime_error;
 };
 
 /**
- * The request that the command line asks for, with all values typed by the schema.
- * UsageError, ValueError or PathError when a path or a value is wrong or NAME is no property; UnknownClass when
- * values are given for a class that the schema does not have.
+ * Builds the request of a command line. Values have the types that the schema declares.
+ * @throws UsageError, ValueError, PathError if a path, a value or a property name is wrong
+ * @throws UnknownClass if the types of the values are unknown
  */
 Request buildRequest(const Arguments& arguments, const Schema& schema);
 

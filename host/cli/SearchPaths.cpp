@@ -14,9 +14,9 @@ namespace {
 
 namespace fs = std::filesystem;
 
-/** A kind of file: its name in messages, and the option and variable that name such files. */
+/** A kind of files: its name in messages, its option and its environment variable. */
 struct Kind {
-    const char* what;
+    const char* name;
     const char* option;
     const char* variable;
     const char* extension;
@@ -31,7 +31,7 @@ fs::path programDirectory() {
     return fs::read_symlink("/proc/self/exe", error).parent_path();
 }
 
-/** The entries of the variable, or nothing when it is not set or empty. */
+/** The entries of an environment variable; none if it is not set or empty. */
 std::vector<std::string> listFrom(const char* variable) {
     std::vector<std::string> entries;
     const char* value = ::secure_getenv(variable);
@@ -44,7 +44,8 @@ std::vector<std::string> listFrom(const char* variable) {
     return entries;
 }
 
-std::vector<std::string> named(const std::vector<std::string>& options, const char* variable) {
+/** The entries of the options, or of the variable if there are none. */
+std::vector<std::string> configured(const std::vector<std::string>& options, const char* variable) {
     return options.empty() ? listFrom(variable) : options;
 }
 
@@ -64,7 +65,7 @@ std::vector<fs::path> filesIn(const fs::path& directory, const Kind& kind) {
 }
 
 std::vector<fs::path> findFiles(const std::vector<std::string>& options, const Kind& kind) {
-    std::vector<std::string> entries = named(options, kind.variable);
+    std::vector<std::string> entries = configured(options, kind.variable);
     const fs::path standard = programDirectory() / installation::dataDirectory;
     std::error_code error;
     if (entries.empty() && fs::is_directory(standard, error)) {
@@ -77,19 +78,19 @@ std::vector<fs::path> findFiles(const std::vector<std::string>& options, const K
         files.insert(files.end(), found.begin(), found.end());
     }
     if (files.empty()) {
-        throw LoadError(std::string("there is no ") + kind.what + ": name a file with " + kind.option + " or in " +
+        throw LoadError(std::string("there is no ") + kind.name + ": name a file with " + kind.option + " or in " +
                         kind.variable);
     }
     return files;
 }
 
 std::vector<fs::path> findLibraryPaths(const std::vector<std::string>& options) {
-    const std::vector<std::string> entries = named(options, libraryVariable);
+    const std::vector<std::string> entries = configured(options, libraryVariable);
     std::vector<fs::path> directories(entries.begin(), entries.end());
     std::error_code error;
     for (const fs::path& directory : directories) {
         if (!fs::is_directory(directory, error)) {
-            throw LoadError(directory.string() + ": there is no such directory of libraries");
+            throw LoadError(directory.string() + ": this library directory does not exist");
         }
     }
     if (entries.empty()) {

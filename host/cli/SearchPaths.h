@@ -16,9 +16,9 @@ struct SearchPaths {
 };
 
 /**
- * Takes each kind from the options, else from its environment variable, else from the directories of the installation
- * or the build tree. A directory means all its .mof or .reg files in the order of their names.
- * LoadError when a named one does not exist, or when there is no schema or registration.
+ * Finds the files of each kind: those of the options, or of the environment variable, or of the installation or build
+ * tree. Of a directory, all .mof or .reg files, sorted by name.
+ * @throws LoadError if a file or directory does not exist, or if there is no schema or registration
  */
 SearchPaths findSearchPaths(const Arguments& arguments);
 

@@ -3,12 +3,12 @@
 #include <algorithm>
 #include <numeric>
 
-#include "schema/Names.h"
+#include "cim/Names.h"
 
 namespace cimhost {
 namespace {
 
-/** How many letters must be put in, taken away or exchanged to make one word the other. */
+/** The Levenshtein distance of two words. */
 std::size_t distance(const std::string& one, const std::string& other) {
     std::vector<std::size_t> row(other.size() + 1);
     std::iota(row.begin(), row.end(), std::size_t{0});
@@ -16,9 +16,9 @@ std::size_t distance(const std::string& one, const std::string& other) {
         std::size_t diagonal = row[0];
         row[0] = i + 1;
         for (std::size_t j = 0; j < other.size(); ++j) {
-            const std::size_t exchanged = diagonal + (one[i] == other[j] ? 0U : 1U);
+            const std::size_t replaced = diagonal + (one[i] == other[j] ? 0U : 1U);
             diagonal = row[j + 1];
-            row[j + 1] = std::min({exchanged, row[j] + 1, row[j + 1] + 1});
+            row[j + 1] = std::min({replaced, row[j] + 1, row[j + 1] + 1});
         }
     }
     return row.back();
@@ -30,7 +30,7 @@ std::string nearest(std::string_view word, const std::vector<std::string>& names
     std::string found;
     std::size_t least = std::max<std::size_t>(1, word.size() / 4) + 1;
     for (const std::string& name : names) {
-        const std::size_t far = distance(foldedName(word), foldedName(name));
+        const std::size_t far = distance(cim::foldedName(word), cim::foldedName(name));
         if (far < least) {
             least = far;
             found = name;

@@ -6,10 +6,10 @@
 
 namespace cimhost {
 
-/** The name that a misspelt word was perhaps meant to be, letter case aside; empty when none is near. */
+/** The name that is most similar to a misspelt word, ignoring letter case; empty if none is similar. */
 std::string nearest(std::string_view word, const std::vector<std::string>& names);
 
-/** "; did you mean NAME?", or nothing when no name is near. */
+/** "; did you mean NAME?", or an empty string if no name is similar. */
 std::string didYouMean(std::string_view word, const std::vector<std::string>& names);
 
 }  // namespace cimhost

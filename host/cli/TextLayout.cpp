@@ -44,43 +44,43 @@ const char* codeOf(Role role) {
     }
 }
 
-/** Has the C library take texts for UTF-8 while it lives, whatever the user's locale is. */
-class Utf8 {
+/** Sets the encoding of the C library to UTF-8, for its lifetime and this thread. */
+class Utf8Locale {
 public:
-    Utf8() : before(uselocale(utf8())) {}
-    ~Utf8() { uselocale(before); }
-    Utf8(const Utf8&) = delete;
-    Utf8& operator=(const Utf8&) = delete;
+    Utf8Locale() : before(uselocale(utf8())) {}
+    ~Utf8Locale() { uselocale(before); }
+    Utf8Locale(const Utf8Locale&) = delete;
+    Utf8Locale& operator=(const Utf8Locale&) = delete;
 
 private:
     static locale_t utf8() {
         static const locale_t locale = newlocale(LC_CTYPE_MASK, "C.UTF-8", nullptr);
-        return locale;  // without it, uselocale leaves all as it is, and bytes are counted
+        return locale;  // if null, uselocale changes nothing, and bytes are counted
     }
 
     locale_t before;
 };
 
 constexpr std::size_t gap = 2;              ///< blanks between columns
-constexpr std::size_t leastLastWidth = 16;  ///< less is no room for the last column
+constexpr std::size_t leastLastWidth = 16;  ///< the last column needs at least this width
 
-/** Where the part of a text ends that begins at a place and has room: behind its last blank, if it has one. */
+/** The end of the longest part that fits into the room: after its last blank, if it has one. */
 std::size_t endOfPart(const std::string& text, std::size_t begin, std::size_t room) {
     std::size_t afterBlank = begin;
     std::size_t width = 0;
-    for (std::size_t at = begin; at < text.size();) {
-        const Character next = firstCharacter(std::string_view(text).substr(at));
+    for (std::size_t position = begin; position < text.size();) {
+        const CharacterSize next = sizeOfFirst(std::string_view(text).substr(position));
         width += next.columns;
-        if (width > room && at > begin) {
-            return afterBlank > begin ? afterBlank : at;
+        if (width > room && position > begin) {
+            return afterBlank > begin ? afterBlank : position;
         }
-        at += next.bytes;
-        afterBlank = text[at - 1] == ' ' ? at : afterBlank;
+        position += next.bytes;
+        afterBlank = text[position - 1] == ' ' ? position : afterBlank;
     }
     return text.size();
 }
 
-/** The text in parts that have room; put together, they are the text. */
+/** Splits a string into parts that fit into the room. @param room in columns; 0: unlimited */
 std::vector<std::string> parts(const std::string& text, std::size_t room) {
     std::vector<std::string> found;
     for (std::size_t begin = 0; begin < text.size();) {
@@ -91,7 +91,7 @@ std::vector<std::string> parts(const std::string& text, std::size_t room) {
     return found;
 }
 
-/** Lays rows out; its widths are those of the columns but the last. */
+/** The layout of some rows. */
 class Layout {
 public:
     Layout(const std::vector<Row>& rows, std::string itsIndent, const Style& itsStyle,
@@ -139,7 +139,7 @@ private:
         return lines;
     }
 
-    /** A cell that goes on below where it begins. */
+    /** A cell whose further lines begin in the same column. */
     std::string below(const Row& row, std::size_t column, std::size_t begins) const {
         const std::size_t room = style.width > begins && begins != 0 ? style.width - begins : 0;
         std::string lines;
@@ -152,7 +152,7 @@ private:
     std::string indent;
     const Style& style;
     const std::vector<Role>& roles;
-    std::vector<std::size_t> widths{};
+    std::vector<std::size_t> widths{};  ///< of all columns but the last
     std::size_t lastBegins = indent.size();
     bool isNarrow = false;
 };
@@ -174,8 +174,8 @@ std::string painted(const std::string& text, Role role, const Style& style) {
                                                              : text;
 }
 
-Character firstCharacter(std::string_view text) {
-    const Utf8 utf8;
+CharacterSize sizeOfFirst(std::string_view text) {
+    const Utf8Locale utf8;
     std::mbstate_t state{};
     wchar_t character{};
     const std::size_t bytes = std::mbrtowc(&character, text.data(), text.size(), &state);
@@ -189,7 +189,7 @@ Character firstCharacter(std::string_view text) {
 std::size_t columnsOf(std::string_view text) {
     std::size_t columns = 0;
     while (!text.empty()) {
-        const Character first = firstCharacter(text);
+        const CharacterSize first = sizeOfFirst(text);
         columns += first.columns;
         text.remove_prefix(first.bytes);
     }

@@ -5,63 +5,63 @@
 #include <string_view>
 #include <vector>
 
-// How output for people is laid out: colours, columns, lines that fit the terminal.
+// Layout of output for people: colours, columns, and lines that fit the terminal.
 
 namespace cimhost {
 
 /** Joins the words with the separator. */
 inline std::string joined(const std::vector<std::string>& words, std::string_view separator) {
-    std::string text;
+    std::string list;
     for (const std::string& word : words) {
-        text += text.empty() ? "" : std::string(separator);
-        text += word;
+        list += list.empty() ? "" : std::string(separator);
+        list += word;
     }
-    return text;
+    return list;
 }
 
 }  // namespace cimhost
 
 namespace cimhost::text {
 
-/** Whether the user wants colours. */
+/** When to use colours. */
 enum class Colours { automatic, always, never };
 
-/** How output for people may look. */
+/** Style of output for people. */
 struct Style {
     bool colours = false;
-    std::size_t width = 0;  ///< columns of the window; 0: as many as are needed
+    std::size_t width = 0;  ///< columns of the terminal; 0: unlimited
 };
 
 /**
- * What suits a descriptor. Automatic colours are for terminals, unless NO_COLOR is set or TERM is "dumb". Only a
- * terminal limits the width: to COLUMNS, or else to what the terminal says.
+ * The style for a file descriptor. With Colours::automatic, a terminal has colours unless NO_COLOR is set or TERM is
+ * "dumb". The width of a terminal is COLUMNS, or else what it reports.
  */
 Style styleFor(int descriptor, Colours mode);
 
-/** What a text stands for, which decides its colour. */
+/** The role of a string, which determines its colour. */
 enum class Role { plain, heading, name, detail, alarm };
 
-/** The text in the colour of its role, or as it is when the style has no colours. */
+/** The string in the colour of its role, or unchanged if the style has no colours. */
 std::string painted(const std::string& text, Role role, const Style& style);
 
-/** A character of a text, or a byte that is none: the bytes that it has, and the columns that a terminal gives it. */
-struct Character {
+/** Size of a character, or of a byte that is not UTF-8: in bytes, and in columns of a terminal. */
+struct CharacterSize {
     std::size_t bytes;
     std::size_t columns;
 };
 
-/** The character at the front of a text in UTF-8 that is not empty. Of letters of East Asia most have two columns. */
-Character firstCharacter(std::string_view text);
+/** The size of the first character of a UTF-8 string that is not empty. Most East Asian characters have two columns. */
+CharacterSize sizeOfFirst(std::string_view text);
 
-/** The columns of a whole text. */
+/** The columns of a string. */
 std::size_t columnsOf(std::string_view text);
 
 using Row = std::vector<std::string>;
 
 /**
- * The rows with their columns under each other; nothing is filled up after the last column. What is too wide for the
- * style's width goes on below, under the last column; where there is no room for that, each cell has a line of its own.
- * @param roles of the columns, from the first; those left out are plain
+ * Aligns the columns of the rows. Lines that exceed the style's width continue below, in the last column; if there is
+ * too little space for that, each cell is on a separate line.
+ * @param roles of the first columns; the others are plain
  */
 std::string aligned(const std::vector<Row>& rows, const std::string& indent, const Style& style = {},
                     const std::vector<Role>& roles = {});

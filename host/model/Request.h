@@ -30,22 +30,22 @@ enum class Operation {
 /** The name of the operation in the standard, such as "EnumerateInstances". */
 const char* nameOf(Operation operation);
 
-/** Whether association providers serve it: associators, references and the operations that return their names. */
+/** Whether an operation is associators, references, or one that returns their names. */
 bool isAssociationOperation(Operation operation);
 
-/** References or their names. */
+/** Whether an operation is references or referenceNames. */
 bool isReferenceOperation(Operation operation);
 
-/** Whether its results are object paths, not instances. */
+/** Whether the results of an operation are object paths, not instances. */
 bool returnsPaths(Operation operation);
 
-/** Names of the properties that a request is about; none means all of them, an empty list none of them. */
+/** Names of requested properties; none: all properties; an empty list: no property. */
 using PropertyList = std::optional<std::vector<std::string>>;
 
 /** The entries of a request's context, such as CMPIInvocationFlags and CMPIPrincipal. */
 using ContextEntries = std::vector<NamedValue>;
 
-/** Names that narrow down an association operation; none where the client sent none. */
+/** Names that restrict the results of an association operation; none if the client did not send one. */
 struct AssociationFilter {
     std::optional<std::string> associationClass{};  ///< not for references, whose result class is the association
     std::optional<std::string> resultClass{};
@@ -85,7 +85,7 @@ struct Request {
     static Request getProperty(ObjectPath path, std::string property);
     ///@}
 
-    /** The same request with that context. */
+    /** Returns the same request with this context. */
     Request with(ContextEntries entries) const;
 };
 

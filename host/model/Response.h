@@ -11,19 +11,19 @@
 
 namespace cimhost {
 
-/** Everything that one provider did in response to a request. */
+/** The status and the results that one provider returned for a request. */
 struct ProviderResponse {
-    Status status{};            ///< as the provider returned it; CMPI_RC_ERR_FAILED when an exception left it
+    Status status{};            ///< as the provider returned it; CMPI_RC_ERR_FAILED if it threw an exception
     bool hasMessage = false;    ///< whether the status carried a message, even an empty one
-    bool threw = false;         ///< whether an exception left the provider
+    bool threw = false;         ///< whether the provider threw an exception
     bool releasedPath = false;  ///< whether the provider released a path that the result keeps
-    ResultEvents events{};      ///< what it returned, in order, also before a failure
-    std::string crashReason{};  ///< why the manager's provider process would have ended, a sentence; empty if it lives
+    ResultEvents events{};      ///< the results, in order, also those before a failure
+    std::string crashReason{};  ///< why the provider's process would have crashed, as a sentence; empty: it would not
 
     int doneCount() const { return cimhost::doneCount(events); }
 };
 
-/** What the client of a request receives, and the responses of the providers that it is made of. */
+/** The response that a client receives, and those of the providers that were called for it. */
 struct Response {
     Status status{};                            ///< OK, or a code with a message; then the results are empty
     std::vector<Instance> instances{};          ///< results that are instances; one for getInstance
@@ -60,7 +60,7 @@ struct Response {
     Instance instance() const { return instances.empty() ? Instance{} : instances.front(); }
     ObjectPath path() const { return paths.empty() ? ObjectPath{} : paths.front(); }
 
-    /** The reason of the first provider whose process would have ended; empty if there is none. */
+    /** The crash reason of the first provider that has one; empty if none has. */
     std::string crashReason() const {
         const auto found = std::find_if(providers.begin(), providers.end(),
                                         [](const ProviderResponse& each) { return !each.crashReason.empty(); });

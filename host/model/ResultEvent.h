@@ -12,7 +12,7 @@
 
 namespace cimhost {
 
-/** An extended error that a provider describes: the attributes of a CMPIError. Strings that are not set are none. */
+/** The attributes of a CMPIError. */
 struct ErrorInfo {
     std::optional<std::string> owningEntity{};
     std::optional<std::string> messageId{};
@@ -34,13 +34,13 @@ struct ErrorInfo {
 /** A call of returnDone. */
 struct Done {};
 
-/** A null pointer that a provider returned as an instance, an object path or an error. The result refused it. */
+/** A null pointer that a provider returned as an instance, an object path or an error. The result rejects it. */
 struct NullResult {};
 
 /** One call of a result function: an instance, an object path, data, an error or null was returned, or returnDone. */
 using ResultEvent = std::variant<Instance, ObjectPath, Value, ErrorInfo, NullResult, Done>;
 
-/** What a provider returned, in order, each as it was at the time of the call. */
+/** The results of a provider, in order. Each is a copy made at the time of the call. */
 using ResultEvents = std::vector<ResultEvent>;
 
 /** All events of one kind, in order. */

@@ -6,10 +6,7 @@
 
 namespace cimhost {
 
-/**
- * How an operation ended: a CIM status code and, where there is something to say, a text for people.
- * The code is a plain number, since a provider may answer one that is no CMPIrc.
- */
+/** A CIM status code with an optional message. The code is an int: a provider can return one that is not a CMPIrc. */
 struct Status {
     int rc = CMPI_RC_OK;
     std::string message{};
@@ -17,9 +14,9 @@ struct Status {
     bool ok() const { return rc == CMPI_RC_OK; }
 };
 
-/** A status with what the operation gives when it is OK; the value is an empty one otherwise. */
+/** A status and, if it is OK, a value. */
 template <class T>
-struct Answer {
+struct StatusOr {
     Status status{};
     T value{};
 

@@ -14,9 +14,9 @@ namespace cimhost {
 struct ObjectPath;
 struct Instance;
 
-/** A CIM datetime: the 25 characters of its text, a time or an interval. */
+/** A CIM datetime: a point in time or an interval, as the standard's 25 characters. */
 struct DateTime {
-    std::string text;
+    std::string value;
 };
 
 /** One 16-bit character. */
@@ -26,7 +26,7 @@ struct Char16 {
 
 /**
  * A single CIM value. std::monostate is the null value. References and embedded instances are
- * shared and never changed once they are part of a value.
+ * shared and immutable.
  */
 using Scalar = std::variant<std::monostate, bool, Char16, std::uint8_t, std::uint16_t, std::uint32_t, std::uint64_t,
                             std::int8_t, std::int16_t, std::int32_t, std::int64_t, float, double, std::string, DateTime,
@@ -35,11 +35,11 @@ using Scalar = std::variant<std::monostate, bool, Char16, std::uint8_t, std::uin
 /** The CIM type of a Scalar's alternative, such as CMPI_uint32 for std::uint32_t; CMPI_null for std::monostate. */
 CMPIType typeOf(const Scalar& scalar);
 
-/** A CIM value with its declared type, which a null value has too. */
+/** A CIM value, also null, with its declared type. */
 struct Value {
     CMPIType type = CMPI_null;       ///< element type, without CMPI_ARRAY
     bool isArray = false;            ///< whether it is an array of that type
-    bool isNull = true;              ///< null as a whole
+    bool isNull = true;              ///< whether the value, or the array, is null
     std::vector<Scalar> elements{};  ///< one element unless an array; none when null
 
     /** A single value of the scalar's own type. */
@@ -56,8 +56,8 @@ struct Value {
     static Value null(CMPIType type, bool isArray = false);
 
     /** @name Strings without characters
-     * Some object managers pass string objects whose character pointer is null. The second is null as well: its data
-     * has the state CMPI_nullValue and yet an object. Either has one element, which is null.
+     * Some object managers pass string objects whose character pointer is null. The data of nullStringObject() also has
+     * the state CMPI_nullValue. Both values have one element, which is null.
      */
     ///@{
     static Value stringWithoutCharacters();
@@ -74,7 +74,7 @@ struct NamedValue {
 
 /** Identity of a CIM instance, or of a class when it has no keys. */
 struct ObjectPath {
-    std::string host{};  ///< empty: this one
+    std::string host{};  ///< empty: the local host
     std::string nameSpace{};
     std::string className{};
     std::vector<NamedValue> keys{};

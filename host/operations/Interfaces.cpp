@@ -54,7 +54,7 @@ Interface* createInterface(const LoadedLibrary& library, const std::string& prov
         factoryFailed(library, provider, call.status);
     }
     if (interface == nullptr || interface->ft == nullptr) {
-        factoryFailed(library, provider, {CMPI_RC_OK, "it answered no interface"});
+        factoryFailed(library, provider, {CMPI_RC_OK, "it returned no interface"});
     }
     return interface;
 }

@@ -11,25 +11,25 @@
 #include "operations/LoadedLibrary.h"
 #include "operations/ManagerBehaviour.h"
 
-// Calls of a provider, and its management interfaces: created by a factory, ended by cleanup.
+// Calls of providers' functions: factories, which create management interfaces, and their cleanup.
 
 namespace cimhost {
 
-/** How a call of a provider's function ended. */
+/** The result of a call of a provider's function. */
 struct ProviderCall {
     Status status{};
     bool hasMessage = false;  ///< whether the status carried a message, even an empty one
-    bool threw = false;       ///< whether an exception left the provider; the status then describes it
+    bool threw = false;       ///< whether the provider threw an exception; the status then describes it
 };
 
-/** The result of a call that an exception left. */
-inline ProviderCall exceptionLeft(const std::string& what) {
-    return {{CMPI_RC_ERR_FAILED, "An exception left the provider: " + what}, false, true};
+/** The result of a call that threw an exception. */
+inline ProviderCall callThatThrew(const std::string& what) {
+    return {{CMPI_RC_ERR_FAILED, "The provider threw an exception: " + what}, false, true};
 }
 
 /**
- * Calls a provider and catches its exceptions, so that the process survives them.
- * @param call returns the provider's CMPIStatus; a LibraryError that it throws is passed on
+ * Calls a provider and catches its exceptions.
+ * @param call returns the provider's CMPIStatus; a LibraryError that it throws is rethrown
  */
 template <class Call>
 ProviderCall callProvider(Call&& call) {
@@ -41,9 +41,9 @@ ProviderCall callProvider(Call&& call) {
     } catch (const LibraryError&) {
         throw;
     } catch (const std::exception& error) {
-        return exceptionLeft(error.what());
+        return callThatThrew(error.what());
     } catch (...) {
-        return exceptionLeft("not derived from std::exception");
+        return callThatThrew("not derived from std::exception");
     }
 }
 
@@ -67,11 +67,11 @@ struct InterfaceTraits<CMPIAssociationMI> {
 };
 
 /**
- * Calls the factory of a provider: <name>_Create_<kind>MI or _Generic_Create_<kind>MI, whichever the library has.
- * Objects that the factory creates are released after the call.
+ * Calls the factory of a provider, <name>_Create_<kind>MI or _Generic_Create_<kind>MI. CMPI objects that the factory
+ * creates are released after the call.
  * @param choice the factory to call if the library has both
- * @return never null, and with a function table; belongs to the provider
- * @throws LibraryError when there is no factory, or it fails, throws or returns no usable interface
+ * @return an interface with a function table; never null; owned by the provider
+ * @throws LibraryError if there is no factory, or if it fails, throws, or returns no usable interface
  */
 template <class Interface>
 Interface* createInterface(const LoadedLibrary& library, const std::string& provider, Broker& broker,
@@ -79,8 +79,8 @@ Interface* createInterface(const LoadedLibrary& library, const std::string& prov
 
 /**
  * Calls the cleanup function of an interface.
- * @param terminating whether the host ends; a provider may otherwise ask to stay loaded
- * @return the provider's status code; CMPI_RC_ERR_FAILED when it throws, CMPI_RC_OK when it has no such function
+ * @param terminating false: the provider may ask to stay loaded
+ * @return the provider's status code; CMPI_RC_ERR_FAILED if it throws, CMPI_RC_OK if it has no cleanup function
  */
 template <class Interface>
 int cleanUp(Interface* interface, Broker& broker, bool terminating);

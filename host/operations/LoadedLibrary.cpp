@@ -6,8 +6,8 @@ namespace cimhost {
 namespace {
 
 std::string reason() {
-    const char* text = dlerror();
-    return text == nullptr ? "unknown reason" : text;
+    const char* message = dlerror();
+    return message == nullptr ? "unknown reason" : message;
 }
 
 }  // namespace
@@ -17,15 +17,15 @@ std::filesystem::path findLibrary(const std::string& location, const LibraryOpti
         return location;
     }
     const std::string name = "lib" + location + ".so";
-    std::string folders;
-    for (const std::filesystem::path& folder : options.searchPath) {
-        if (std::error_code ignored; std::filesystem::exists(folder / name, ignored)) {
-            return folder / name;
+    std::string searched;
+    for (const std::filesystem::path& directory : options.searchPath) {
+        if (std::error_code ignored; std::filesystem::exists(directory / name, ignored)) {
+            return directory / name;
         }
-        folders += (folders.empty() ? "" : ", ") + folder.string();
+        searched += (searched.empty() ? "" : ", ") + directory.string();
     }
-    if (!folders.empty()) {
-        throw LibraryNotFound(name + " is in none of these folders: " + folders);
+    if (!searched.empty()) {
+        throw LibraryNotFound(name + " is in none of these directories: " + searched);
     }
     return name;
 }
@@ -33,11 +33,11 @@ std::filesystem::path findLibrary(const std::string& location, const LibraryOpti
 LoadedLibrary::LoadedLibrary(std::filesystem::path itsFile, int flags)
     : libraryFile(std::move(itsFile)), handle(dlopen(libraryFile.c_str(), flags)) {
     if (handle == nullptr) {
-        const std::string text = "Cannot load " + libraryFile.string() + ": " + reason();
+        const std::string message = "Cannot load " + libraryFile.string() + ": " + reason();
         if (libraryFile.has_parent_path()) {
-            throw LibraryNotLoaded(text);
+            throw LibraryNotLoaded(message);
         }
-        throw LibraryNotFound(text);
+        throw LibraryNotFound(message);
     }
 }
 

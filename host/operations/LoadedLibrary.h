@@ -9,7 +9,7 @@
 
 namespace cimhost {
 
-/** A provider cannot be used: its library is missing or cannot be loaded, or its factory is missing or fails. */
+/** A provider's library is missing or cannot be loaded, or its factory is missing or fails. */
 class LibraryError : public std::runtime_error {
 public:
     using std::runtime_error::runtime_error;
@@ -21,7 +21,7 @@ public:
     using LibraryError::LibraryError;
 };
 
-/** A library is in none of the directories that were searched. */
+/** None of the searched directories contains the library. */
 class LibraryNotFound : public LibraryNotLoaded {
 public:
     using LibraryNotLoaded::LibraryNotLoaded;
@@ -29,27 +29,27 @@ public:
 
 /** The directories to search for libraries, and the flags to load them with. */
 struct LibraryOptions {
-    std::vector<std::filesystem::path> searchPath{};  ///< directories, the first wins; none: where the system looks
-    int flags = RTLD_NOW | RTLD_GLOBAL;               ///< for dlopen; these are what other object managers use
+    std::vector<std::filesystem::path> searchPath{};  ///< searched in order; empty: the system's directories
+    int flags = RTLD_NOW | RTLD_GLOBAL;               ///< of dlopen; other object managers use these
 };
 
 /**
- * The file of a provider library.
- * @param location "Name" for libName.so in one of the directories; a name with a slash is the file itself
- * @throws LibraryNotFound when no directory has it; the message names them all
+ * Finds the file of a provider library.
+ * @param location "Name" for libName.so in one of the directories; a name with a slash is a file name
+ * @throws LibraryNotFound if no directory contains it; the message names all of them
  */
 std::filesystem::path findLibrary(const std::string& location, const LibraryOptions& options);
 
-/** A shared library in this process, closed at the end unless it is kept. */
+/** A shared library in this process. The destructor closes it unless keep() was called. */
 class LoadedLibrary {
 public:
-    /** @throws LibraryNotLoaded with the reason that the system gives */
+    /** @throws LibraryNotLoaded with the reason of dlopen */
     LoadedLibrary(std::filesystem::path itsFile, int flags);
     ~LoadedLibrary();
     LoadedLibrary(const LoadedLibrary&) = delete;
     LoadedLibrary& operator=(const LoadedLibrary&) = delete;
 
-    /** A function of the library; null when it has none of that name. The caller knows its type. */
+    /** Returns a function of the library; null if it does not export the name. */
     template <class Function>
     Function* function(const std::string& name) const {
         return reinterpret_cast<Function*>(symbol(name));
@@ -57,7 +57,7 @@ public:
 
     const std::filesystem::path& file() const { return libraryFile; }
 
-    /** Leaves the library in the process for good. */
+    /** Keeps the library in the process until it ends. */
     void keep() { isKept = true; }
 
 private:

@@ -3,7 +3,7 @@
 namespace cimhost {
 namespace {
 
-/** The provider's message, that of an extended error that it returned, or else the code. */
+/** The provider's message, or that of a CMPIError that it returned, or a sentence with the code. */
 std::string messageOf(const ProviderResponse& response, Operation operation) {
     if (!response.status.message.empty()) {
         return response.status.message;
@@ -13,8 +13,8 @@ std::string messageOf(const ProviderResponse& response, Operation operation) {
             return *error.message;
         }
     }
-    return std::string("The provider answered ") + nameOf(operation) + " with code " +
-           std::to_string(response.status.rc) + " and no message.";
+    return std::string("The provider returned code ") + std::to_string(response.status.rc) + " for " +
+           nameOf(operation) + ", without a message.";
 }
 
 }  // namespace
@@ -42,7 +42,7 @@ Status ManagerBehaviour::statusOf(const ProviderResponse& response, Operation op
     return response.status.ok() ? Status{} : Status{response.status.rc, messageOf(response, operation)};
 }
 
-Answer<ObjectPath> ManagerBehaviour::createdPath(const ProviderResponse& response) const {
+StatusOr<ObjectPath> ManagerBehaviour::createdPath(const ProviderResponse& response) const {
     for (const ResultEvent& event : response.events) {
         if (const auto* path = std::get_if<ObjectPath>(&event)) {
             return {{}, *path};
@@ -51,7 +51,9 @@ Answer<ObjectPath> ManagerBehaviour::createdPath(const ProviderResponse& respons
             return {{}, instance->path};
         }
     }
-    return {{CMPI_RC_ERR_FAILED, "The provider accepted CreateInstance, but returned neither path nor instance."}, {}};
+    return {{CMPI_RC_ERR_FAILED,
+             "The provider reported success for CreateInstance, but returned neither a path nor an instance."},
+            {}};
 }
 
 }  // namespace cimhost

@@ -12,21 +12,21 @@
 
 namespace cimhost {
 
-/** Which factory creates a provider, "<name>_Create_..." or "_Generic_Create_...", where a library has both. */
+/** The factory to call if a library has both "<name>_Create_..." and "_Generic_Create_...". */
 enum class FactoryChoice {
     named,
     generic,
-    neither  ///< such a library cannot be used
+    neither  ///< the library is rejected
 };
 
-/** How an object manager loads libraries, and starts and ends providers. */
+/** How an object manager loads libraries and calls factories and cleanup. */
 struct ProviderPolicy {
     FactoryChoice factory = FactoryChoice::named;
-    bool bindsLazily = false;             ///< functions of a library are resolved when they are first called
-    bool startsAllInterfaces = false;     ///< the instance and the association interface of a class start together
-    bool startsProviderPerClass = false;  ///< factories are called once per requested class, not once per provider
+    bool bindsLazily = false;             ///< functions of a library are resolved at their first call
+    bool startsAllInterfaces = false;     ///< the instance and association interfaces of a class are created together
+    bool startsProviderPerClass = false;  ///< factories are called once per requested class, not per provider
     bool startsConcurrently = false;      ///< factories of different providers may run concurrently
-    bool staysOnlyIfAllAsk = false;       ///< an idle library stays if all its interfaces ask for it, not if one does
+    bool staysOnlyIfAllAsk = false;       ///< an idle library stays only if all its interfaces ask for it
 };
 
 /**
@@ -40,7 +40,7 @@ public:
     ManagerBehaviour(const ManagerBehaviour&) = delete;
     ManagerBehaviour& operator=(const ManagerBehaviour&) = delete;
 
-    /** The standard behaviour; lives as long as the program. */
+    /** The standard behaviour; valid until the program ends. */
     static const ManagerBehaviour& standard();
 
     /** @name The broker */
@@ -53,40 +53,41 @@ public:
     ///@{
     virtual ProviderPolicy policy() const { return {}; }
 
-    /** What a client receives when a library cannot be loaded; none: the error is the caller's. */
+    /** The status that a client receives if a library cannot be loaded; none: the exception is thrown to the caller. */
     virtual std::optional<Status> statusOf(const LibraryNotLoaded&) const { return std::nullopt; }
     ///@}
 
-    /** @name Requests, before a provider receives them */
+    /** @name Requests that a provider is to receive */
     ///@{
-    /** The context entry CMPIPrincipal of requests without one. */
+    /** The context entry CMPIPrincipal of a request that has none. */
     virtual Value principal() const { return Value::of(""); }
 
-    /** Whether an association operation calls a provider once per association class, and names the class. */
+    /** Whether an association operation calls a provider once per association class, and passes the class. */
     virtual bool namesAssociationClass() const { return true; }
 
-    /** Checks the types of the properties that a client sent, and may convert them. @return why it is refused, or OK */
+    /** Checks the types of the properties that a client sent, and may convert them. @return not OK: reject the request
+     */
     virtual Status coerceTypes(Request& request, const Broker& broker) const;
 
-    /** Changes a request into the form in which the provider receives it. */
+    /** Changes a request into the form that the manager passes to providers. */
     virtual void adapt(Request& request, const Broker& broker) const;
 
     virtual ResultRules resultRules(Operation operation) const;
 
-    /** Calls the provider, on the thread that the manager uses for the request, and waits for its return. */
+    /** Calls the provider on the thread that the manager uses for the request, and waits until it returns. */
     virtual void onRequestThread(const std::function<void()>& callProvider) const { callProvider(); }
     ///@}
 
     /** @name Responses */
     ///@{
-    /** Why the provider process would have ended with the response, as a sentence; empty if it lives. */
+    /** Why the response would have crashed the provider's process, as a sentence; empty: it would not. */
     virtual std::string crashReason(const ProviderResponse& response, Operation operation) const;
 
-    /** The status of one provider's response as the client receives it: OK, or a code with a message. */
+    /** The status that the client receives for a provider's response: OK, or a code with a message. */
     virtual Status statusOf(const ProviderResponse& response, Operation operation) const;
 
-    /** The path of a created instance: the first that is returned, as such or in an instance. */
-    virtual Answer<ObjectPath> createdPath(const ProviderResponse& response) const;
+    /** The path of a created instance: the first returned path, or the path of the first returned instance. */
+    virtual StatusOr<ObjectPath> createdPath(const ProviderResponse& response) const;
     ///@}
 };
 

@@ -4,9 +4,9 @@
 #include <utility>
 
 #include "broker/NamedValues.h"
+#include "cim/Names.h"
 #include "operations/RequestRunner.h"
 #include "operations/ResponseMapping.h"
-#include "schema/Names.h"
 
 namespace cimhost {
 namespace {
@@ -30,7 +30,7 @@ auto associationClassOf(Operation operation) {
     return isReferenceOperation(operation) ? &AssociationFilter::resultClass : &AssociationFilter::associationClass;
 }
 
-/** The instance of a creation: keys that are only in the path precede its properties. */
+/** Returns the instance of a creation: the keys that are only in the path, then the properties. */
 Instance withKeys(const ObjectPath& path, const Instance& instance) {
     Instance complete{path, {}};
     for (const NamedValue& key : path.keys) {
@@ -42,16 +42,16 @@ Instance withKeys(const ObjectPath& path, const Instance& instance) {
     return complete;
 }
 
-/** Keeps only the first class of each provider. */
-void dropSameProviders(std::vector<const ServedClass*>& classes) {
-    std::vector<const ServedClass*> kept;
-    std::copy_if(classes.begin(), classes.end(), std::back_inserter(kept), [&](const ServedClass* each) {
-        return std::none_of(kept.begin(), kept.end(), [&](const ServedClass* other) {
+/** Removes the classes of providers that an earlier class has, too. */
+void removeSameProviders(std::vector<const ServedClass*>& classes) {
+    std::vector<const ServedClass*> unique;
+    std::copy_if(classes.begin(), classes.end(), std::back_inserter(unique), [&](const ServedClass* each) {
+        return std::none_of(unique.begin(), unique.end(), [&](const ServedClass* other) {
             return other->address.location == each->address.location &&
                    other->address.provider == each->address.provider;
         });
     });
-    classes = std::move(kept);
+    classes = std::move(unique);
 }
 
 }  // namespace
@@ -80,7 +80,7 @@ void ObjectManager::completeContext(Request& request) const {
 ProviderAddress ObjectManager::addressOf(const ServedClass& served) const {
     ProviderAddress address = served.address;
     if (policy.startsProviderPerClass) {
-        address.forClass = foldedName(served.className);
+        address.forClass = cim::foldedName(served.className);
     }
     return address;
 }
@@ -111,7 +111,7 @@ ProviderResponse ObjectManager::call(const ServedClass& served, const Request& r
 Response ObjectManager::perform(Request request) {
     const ProviderPool::InUse use(pool);
     if (pool.isStopped()) {
-        return Response::failed({CMPI_RC_ERR_FAILED, stoppingText});
+        return Response::failed({CMPI_RC_ERR_FAILED, stoppingMessage});
     }
     if (request.operation > Operation::referenceNames) {
         return notSupported(request.operation);
@@ -159,12 +159,12 @@ Response ObjectManager::performForAssociation(Request request) {
     }
     const bool namesClass = behaviour.namesAssociationClass();
     if (!namesClass) {
-        dropSameProviders(found);
+        removeSameProviders(found);
     }
     std::vector<ProviderResponse> responses;
     for (const ServedClass* served : found) {
         if (namesClass) {
-            const bool isRequested = requested && sameName(served->className, *requested);
+            const bool isRequested = requested && cim::sameName(served->className, *requested);
             request.filter.*associationClass = isRequested ? *requested : served->className;
         }
         responses.push_back(call<CMPIAssociationMI>(*served, request));

@@ -12,26 +12,26 @@
 
 namespace cimhost {
 
-/** What an object manager is made with. */
+/** The parameters of an object manager. */
 struct ObjectManagerOptions {
     LibraryOptions libraries{};
-    ClassInfoLookup classInfo{};                  ///< none: no class is known; see BrokerOptions
-    std::function<void(const LogRecord&)> log{};  ///< none: what providers log is dropped
-    ContextEntries context{};                     ///< entries that every request's context has, such as CMPIPrincipal
+    ClassInfoLookup classInfo{};                          ///< none: all classes are unknown; see BrokerOptions
+    std::function<void(const LogRecord&)> log{};          ///< none: log records are discarded
+    ContextEntries context{};                             ///< entries of every request's context, such as CMPIPrincipal
     std::shared_ptr<const ManagerBehaviour> behaviour{};  ///< null: the standard behaviour
 };
 
 /**
- * The embedded object manager: sends each request to the provider that is registered for it, and maps its response to
- * what the client receives. Clients and providers (UpCalls) use the same function. Requests run on the calling thread
- * unless the behaviour uses another, and may run concurrently. No lock is held while a provider runs, except by its
- * factory.
+ * The embedded object manager. It calls the provider that is registered for a request, and maps the provider's response
+ * to the client's. Clients and providers (UpCalls) use the same function. A request runs on the calling thread unless
+ * the behaviour uses another. Requests may run concurrently; a lock is held only while a factory runs.
  *
- * If a provider's process would have ended (ManagerBehaviour::crashReason), the provider's library is unloaded without
- * cleanup as soon as no request runs: its state in memory is lost.
+ * If a response would have crashed the provider's process (ManagerBehaviour::crashReason), the library is unloaded
+ * without cleanup as soon as no request is running. The provider then loses its state in memory.
  *
- * The context of a request is that of the request, completed by the options' entries and by CMPIInvocationFlags (0),
- * CMPIInitNameSpace (the request's namespace) and CMPIPrincipal (ManagerBehaviour::principal).
+ * A provider receives the context entries of the request, those of the options, and CMPIInvocationFlags (0),
+ * CMPIInitNameSpace (the request's namespace) and CMPIPrincipal (ManagerBehaviour::principal). Of entries with the same
+ * name, the first of these applies.
  */
 class ObjectManager : public UpCalls {
 public:
@@ -39,28 +39,28 @@ public:
     ~ObjectManager() override;
 
     /**
-     * Performs a request. A provider receives the instance of a creation with exactly its properties, preceded by those
-     * keys of the path that are not among them, and the instance of a modification with exactly its properties.
+     * Performs a request. The provider receives the instance of a creation or modification with exactly its properties.
+     * For a creation, the keys of the path that are not among the properties precede them.
      *
-     * Association operations call the provider of the association class (the result class, for references) and those of
-     * its registered subclasses or, without a class, those of all registered association classes; each receives the
-     * class that it is called for.
+     * An association operation calls the providers of the association class (for references, the result class) and of
+     * its registered subclasses; without a class, those of all registered association classes. Each receives the class
+     * that it is called for.
      *
-     * @return the results, or a status that is not OK, with a message: that of mapResponses(), or
-     * CMPI_RC_ERR_INVALID_NAMESPACE and CMPI_RC_ERR_INVALID_CLASS when no provider is registered;
+     * @return the results, or a status that is not OK, with a message: that of mapResponses();
+     * CMPI_RC_ERR_INVALID_NAMESPACE or CMPI_RC_ERR_INVALID_CLASS if no provider is registered;
      * CMPI_RC_ERR_NOT_SUPPORTED for methods and single properties
-     * @throws LibraryError when a provider cannot be loaded, unless the behaviour has a status for it
+     * @throws LibraryError if a provider cannot be loaded, unless the behaviour has a status for it
      */
     Response perform(Request request) override;
 
     /**
-     * Cleans up all providers and unloads libraries that do not ask to stay, as after a time without requests. They are
-     * loaded again when they are needed. Not while a request runs.
+     * Cleans up all providers and unloads the libraries that do not ask to stay, as an idle object manager does. The
+     * next request loads them again. Must not be called while a request is running.
      */
     void idle() { pool.idle(); }
 
     /**
-     * Cleans up all providers for good, without waiting for requests that run. Later requests, up-calls too, fail with
+     * Cleans up all providers without waiting for running requests. Later requests and up-calls fail with
      * CMPI_RC_ERR_FAILED.
      */
     void stop() { pool.stop(); }
@@ -76,11 +76,11 @@ private:
     void completeContext(Request& request) const;
     ProviderAddress addressOf(const ServedClass& served) const;
 
-    /** The interface of a class's provider; starts the other interface, too, where the policy says so. */
+    /** Returns the interface of a class's provider. Also creates the other interface if the policy requires it. */
     template <class Interface>
     Interface* started(const ServedClass& served);
 
-    /** The response of the class's provider. */
+    /** Calls the provider of a class. */
     template <class Interface>
     ProviderResponse call(const ServedClass& served, const Request& request);
 

@@ -10,12 +10,12 @@
 namespace cimhost {
 namespace {
 
-/** Whether a cleanup answers that the library has to stay. */
-bool asksToStay(int answer) {
-    return answer == CMPI_RC_DO_NOT_UNLOAD || answer == CMPI_RC_NEVER_UNLOAD;
+/** Whether the status code of a cleanup asks to keep the library loaded. */
+bool asksToStay(int rc) {
+    return rc == CMPI_RC_DO_NOT_UNLOAD || rc == CMPI_RC_NEVER_UNLOAD;
 }
 
-/** Marks a provider as starting, for as long as it lives. */
+/** Marks a provider as starting, for its lifetime. */
 class Starting {
 public:
     explicit Starting(bool& itsFlag) : flag(itsFlag) { flag = true; }
@@ -103,7 +103,7 @@ void ProviderPool::unloadWhenUnused(const std::string& location) {
     crashed.insert(location);
 }
 
-/** A request that arrives meanwhile waits for the mutex before it receives an interface. */
+/** Requests that arrive meanwhile wait for the mutex before they receive an interface. */
 void ProviderPool::unloadCrashed() {
     const std::lock_guard<std::mutex> crashedLock(crashedMutex);
     if (crashed.empty()) {
@@ -119,7 +119,7 @@ void ProviderPool::unloadCrashed() {
     }
 }
 
-/** A cleanup may wait for requests, which may need a mutex: none is held then. */
+/** Holds no mutex during a cleanup, which may wait for requests that need one. */
 void ProviderPool::stop() {
     const InUse use(*this);
     if (stopped.exchange(true)) {
@@ -176,22 +176,22 @@ Interface* ProviderPool::get(const ProviderAddress& address) {
     if (interface == nullptr) {
         requireRunning();
         if (found.isStarting) {
-            throw LibraryError("Provider " + address.provider + " needs itself to start.");
+            throw LibraryError("Provider " + address.provider + " sent a request to itself while it was starting.");
         }
         const Starting starting(found.isStarting);
-        Interface* made = createInterface<Interface>(*found.library, address.provider, broker, policy.factory);
+        Interface* created = createInterface<Interface>(*found.library, address.provider, broker, policy.factory);
         if (stopped) {
-            end(found.library, made);
+            end(found.library, created);
         }
         requireRunning();
-        interface = made;
+        interface = created;
     }
     return interface;
 }
 
 void ProviderPool::requireRunning() const {
     if (stopped) {
-        throw LibraryError(stoppingText);
+        throw LibraryError(stoppingMessage);
     }
 }
 

@@ -16,12 +16,12 @@
 namespace cimhost {
 
 /** Message for requests that arrive after stop(). */
-constexpr const char* stoppingText = "The object manager is stopping.";
+constexpr const char* stoppingMessage = "The object manager is stopping.";
 
 /**
- * The providers in this process. Libraries are loaded and factories called when a provider is first needed, once an
- * interface; after a failure the next need tries again. In the end every interface is cleaned up and every library
- * closed, unless its provider's cleanup asks to stay. Safe to use from several threads and from inside requests.
+ * The providers in this process. The first request for a provider loads its library and calls its factory, once per
+ * interface; after a failure, the next request tries again. stop() cleans up all interfaces. The destructor closes the
+ * libraries, except those whose cleanup asks to stay. Safe to use from several threads and from inside requests.
  */
 class ProviderPool {
 public:
@@ -30,7 +30,7 @@ public:
     ProviderPool(const ProviderPool&) = delete;
     ProviderPool& operator=(const ProviderPool&) = delete;
 
-    /** Marks the pool as used by a request; requests may be nested. */
+    /** Marks the pool as used by a request, for its lifetime. Requests may be nested. */
     class InUse {
     public:
         explicit InUse(ProviderPool& itsPool);
@@ -42,35 +42,37 @@ public:
         ProviderPool& pool;
     };
 
-    /** The provider's interface, valid while the caller's InUse lives. @throws LibraryError when it cannot be started
-     */
+    /** Returns a provider's interface, valid for the lifetime of the caller's InUse. @throws LibraryError on failure */
     template <class Interface>
     Interface* get(const ProviderAddress& address);
 
-    /** Cleans up all providers and unloads the libraries that do not ask to stay. Not while a request runs. */
+    /**
+     * Cleans up all providers and unloads the libraries that do not ask to stay. Must not be called while a request is
+     * running.
+     */
     void idle();
 
     /**
-     * Unloads a library without cleanup, as if its process had ended, as soon as no request uses the pool. The next
-     * request that needs it loads it again.
+     * Unloads a library without cleanup as soon as no request uses the pool, as if its process had crashed. The next
+     * request for its providers loads it again.
      */
     void unloadWhenUnused(const std::string& location);
 
-    /** Cleans up all providers for good, even while requests run. Libraries stay until the pool is destroyed. */
+    /** Cleans up all providers, even while requests run. Their libraries stay loaded until the pool is destroyed. */
     void stop();
     bool isStopped() const { return stopped; }
 
 private:
-    /** A provider in its library, with the interfaces made so far. */
+    /** A provider and the interfaces that were created. */
     struct Provider {
         LoadedLibrary* library = nullptr;
         CMPIInstanceMI* instance = nullptr;
         CMPIAssociationMI* association = nullptr;
         bool isStarting = false;  ///< a factory is running
-        ChainMutex mutex{};       ///< held while a factory runs, where factories of other classes may run meanwhile
+        ChainMutex mutex{};       ///< held while a factory runs, if factories may run concurrently
     };
 
-    /** Some order of addresses. */
+    /** An order of addresses, for use as keys. */
     struct AddressLess {
         bool operator()(const ProviderAddress& left, const ProviderAddress& right) const;
     };
@@ -80,15 +82,15 @@ private:
 
     using Libraries = std::map<std::string, std::unique_ptr<LoadedLibrary>>;  ///< by location
 
-    /** @param library null only where there is no interface either */
+    /** Cleans up an interface that is not null, and keeps the library if it asks for that. */
     template <class Interface>
     void end(LoadedLibrary* library, Interface* interface);
 
-    /** Closes a library, and forgets its providers. */
+    /** Closes a library and removes its providers. */
     Libraries::iterator unload(Libraries::iterator library);
     void unloadCrashed();
 
-    /** Cleans up the providers of a library; whether it stays. */
+    /** Cleans up the providers of a library. @return whether the library stays */
     bool staysWhenIdle(const LoadedLibrary& library);
 
     /** The mutex of a provider's interfaces. */
@@ -101,12 +103,12 @@ private:
     Broker& broker;
     LibraryOptions options;
     ProviderPolicy policy;
-    ChainMutex mutex;  ///< held while a factory runs, which may make a request that needs another provider
+    ChainMutex mutex;  ///< held while a factory runs, which may send a request to another provider
     Libraries libraries;
     std::map<ProviderAddress, Provider, AddressLess> providers;
     std::atomic<std::size_t> uses{0};
     std::mutex crashedMutex{};
-    std::set<std::string> crashed;  ///< locations of libraries to unload when the pool is not in use
+    std::set<std::string> crashed;  ///< locations of the libraries to unload
     std::atomic<bool> stopped{false};
 };
 

@@ -3,13 +3,13 @@
 #include <algorithm>
 #include <utility>
 
-#include "schema/Names.h"
+#include "cim/Names.h"
 
 namespace cimhost {
 namespace {
 
 bool isIn(const ServedClass& entry, std::string_view nameSpace) {
-    return sameName(entry.nameSpace, nameSpace);
+    return cim::sameName(entry.nameSpace, nameSpace);
 }
 
 }  // namespace
@@ -34,7 +34,7 @@ void ProviderRegistry::add(const ProviderRegistration& registration) {
 
 void ProviderRegistry::add(ServedClass entry) {
     const auto same = std::find_if(entries.begin(), entries.end(), [&](const ServedClass& each) {
-        return each.kind == entry.kind && isIn(each, entry.nameSpace) && sameName(each.className, entry.className);
+        return each.kind == entry.kind && isIn(each, entry.nameSpace) && cim::sameName(each.className, entry.className);
     });
     if (same == entries.end()) {
         entries.push_back(std::move(entry));
@@ -50,7 +50,7 @@ bool ProviderRegistry::knowsNameSpace(std::string_view nameSpace) const {
 const ServedClass* ProviderRegistry::find(std::string_view nameSpace, std::string_view className,
                                           InterfaceKind kind) const {
     const auto found = std::find_if(entries.begin(), entries.end(), [&](const ServedClass& each) {
-        return each.kind == kind && isIn(each, nameSpace) && sameName(each.className, className);
+        return each.kind == kind && isIn(each, nameSpace) && cim::sameName(each.className, className);
     });
     return found == entries.end() ? nullptr : &*found;
 }

@@ -9,11 +9,11 @@
 
 namespace cimhost {
 
-/** Where a provider is: its library and its name there. */
+/** The library of a provider, and its name there. */
 struct ProviderAddress {
     std::string location{};  ///< see findLibrary()
     std::string provider{};  ///< prefix of its factories
-    std::string forClass{};  ///< the class that it is started for; empty: for all that it serves
+    std::string forClass{};  ///< the class that it is created for; empty: all classes that it serves
 };
 
 /** A class that a provider serves in a namespace. */
@@ -25,21 +25,21 @@ struct ServedClass {
 };
 
 /**
- * Which provider serves which class. Names of classes and namespaces ignore letter case. Fill it, then share it for
- * reading; pointers to entries stay good until the next add().
+ * The provider of each class. Names of classes and namespaces are case-insensitive. Pointers to entries are valid until
+ * the next add(). Concurrent reading is safe.
  */
 class ProviderRegistry {
 public:
     ProviderRegistry() = default;
     explicit ProviderRegistry(const std::vector<ProviderRegistration>& registrations);
 
-    /** Adds a registration; it takes the place of an earlier one for the same namespace, class and kind. */
+    /** Adds a registration, or replaces that for the same namespace, class and kind. */
     void add(const ProviderRegistration& registration);
 
-    /** Whether any registration names the namespace. */
+    /** Whether a class is registered for the namespace. */
     bool knowsNameSpace(std::string_view nameSpace) const;
 
-    /** The provider of that kind for a class in a namespace; null when there is none. */
+    /** The provider of that kind for a class in a namespace; null if there is none. */
     const ServedClass* find(std::string_view nameSpace, std::string_view className, InterfaceKind kind) const;
 
     /** All association classes of a namespace, in the order in which they were added. */

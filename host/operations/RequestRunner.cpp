@@ -9,7 +9,7 @@ namespace {
 
 constexpr CMPIStatus notSupported{CMPI_RC_ERR_NOT_SUPPORTED, nullptr};
 
-/** Calls a function of a table, if it is there. */
+/** Calls a function of a table unless it is null. */
 template <class Function, class... Arguments>
 CMPIStatus callEntry(Function* function, Arguments... arguments) {
     return function == nullptr ? notSupported : function(arguments...);

@@ -10,10 +10,10 @@
 namespace cimhost {
 
 /**
- * Runs one request against one management interface and returns all that the provider did. Objects that the provider
- * creates through the broker are released at the end of the request. A function that the provider lacks results in
- * CMPI_RC_ERR_NOT_SUPPORTED. Requests may be nested.
- * @param request an operation of that interface's kind; std::invalid_argument for one of the other kind
+ * Sends one request to a management interface. Objects that the provider creates through the broker are released at the
+ * end of the request. The status is CMPI_RC_ERR_NOT_SUPPORTED if the provider lacks the function. Requests may be
+ * nested.
+ * @throws std::invalid_argument if the operation belongs to the other kind of interface
  */
 ProviderResponse runRequest(Broker& broker, CMPIInstanceMI* interface, Request request,
                             const ManagerBehaviour& behaviour = ManagerBehaviour::standard());
@@ -21,7 +21,7 @@ ProviderResponse runRequest(Broker& broker, CMPIAssociationMI* interface, Reques
                             const ManagerBehaviour& behaviour = ManagerBehaviour::standard());
 
 /**
- * Runs any call of a provider as a separate request, on the calling thread.
+ * Calls a provider on the calling thread, in a separate RequestScope.
  * @param call called with a RequestScope&, const CMPIContext* and const CMPIResult*; returns a CMPIStatus
  */
 template <class Call>
@@ -30,10 +30,10 @@ ProviderResponse runCall(Broker& broker, const ContextEntries& entries, Call&& c
     RequestScope scope(broker);
     const CMPIContext* context = scope.context(entries);
     const CMPIResult* result = scope.result(response.events, rules);
-    ProviderCall outcome = callProvider([&] { return call(scope, context, result); });
-    response.status = std::move(outcome.status);
-    response.hasMessage = outcome.hasMessage;
-    response.threw = outcome.threw;
+    ProviderCall finished = callProvider([&] { return call(scope, context, result); });
+    response.status = std::move(finished.status);
+    response.hasMessage = finished.hasMessage;
+    response.threw = finished.threw;
     response.releasedPath = RequestScope::isPathReleased(result);
     return response;
 }

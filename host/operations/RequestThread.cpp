@@ -7,7 +7,7 @@
 namespace cimhost {
 namespace {
 
-/** The chain of another thread that this one works for; null: none. */
+/** The chain that this thread is a member of; null if it has a separate one. */
 RequestChain& joinedChain() {
     thread_local RequestChain chain = nullptr;
     return chain;
@@ -33,10 +33,10 @@ void onNewThread(const std::function<void()>& body) {
         const ChainMember member(chain);
         body();
     });
-    std::future<void> outcome = task.get_future();
+    std::future<void> done = task.get_future();
     std::thread thread(std::move(task));
     thread.join();
-    outcome.get();
+    done.get();
 }
 
 void ChainMutex::lock() {

@@ -4,17 +4,17 @@
 #include <functional>
 #include <mutex>
 
-// Which requests belong together, on whatever threads they run.
+// Request chains: a request and the requests that providers send while they perform it, possibly on other threads.
 
 namespace cimhost {
 
-/** Identifies a request together with the up-calls that come out of it, on whatever threads these run. */
+/** Identifies a request chain. */
 using RequestChain = const void*;
 
-/** The chain that the calling thread works for. A thread that works for no other one's chain is one of its own. */
+/** The chain of the calling thread. A thread that is not a ChainMember has a separate chain. */
 RequestChain requestChain();
 
-/** Lets the calling thread work for a chain, for as long as it lives. */
+/** Makes the calling thread a member of a chain, for its lifetime. */
 class ChainMember {
 public:
     explicit ChainMember(RequestChain chain);
@@ -23,10 +23,10 @@ public:
     ChainMember& operator=(const ChainMember&) = delete;
 };
 
-/** Runs the body on a new thread, which works for the caller's chain; rethrows what it throws. */
+/** Runs the body on a new thread of the caller's chain, and waits for it. Rethrows its exceptions. */
 void onNewThread(const std::function<void()>& body);
 
-/** A mutex that a chain of requests may lock again while it holds it, on another thread too. */
+/** A recursive mutex whose owner is a chain, not a thread. */
 class ChainMutex {
 public:
     void lock();
@@ -36,7 +36,7 @@ private:
     std::mutex mutex;
     std::condition_variable freed;
     RequestChain owner = nullptr;
-    int depth = 0;  ///< how often the owner holds it
+    int depth = 0;  ///< number of locks that the owner holds
 };
 
 }  // namespace cimhost

@@ -27,21 +27,21 @@ constexpr const char* kindName = "instance";
 template <>
 constexpr const char* kindName<ObjectPath> = "object path";
 
-/** Whether the event is of that kind, or one that every operation may have. */
+/** Whether an event is of this kind or of one that every operation may have. */
 template <class Kind>
 bool isExpected(const ResultEvent& event) {
     return std::holds_alternative<Kind>(event) || std::holds_alternative<Done>(event) ||
            std::holds_alternative<ErrorInfo>(event) || std::holds_alternative<NullResult>(event);
 }
 
-/** Appends all results of that kind. */
+/** Appends all results of this kind; an error if there are others. */
 template <class Kind>
 Status collect(const std::vector<ProviderResponse>& responses, Operation operation, std::vector<Kind>& results) {
     for (const ProviderResponse& response : responses) {
         if (!std::all_of(response.events.begin(), response.events.end(), isExpected<Kind>)) {
             results.clear();
-            return {CMPI_RC_ERR_FAILED, std::string("The provider answered ") + nameOf(operation) +
-                                            " with something other than an " + kindName<Kind> + "."};
+            return {CMPI_RC_ERR_FAILED, std::string("The provider returned something other than an ") + kindName<Kind> +
+                                            " for " + nameOf(operation) + "."};
         }
         const std::vector<Kind> found = eventsOf<Kind>(response.events);
         results.insert(results.end(), found.begin(), found.end());
@@ -59,7 +59,7 @@ Status collectOne(const Request& request, Response& response) {
 }
 
 Status collectCreated(const ManagerBehaviour& behaviour, Response& response) {
-    Answer<ObjectPath> created = behaviour.createdPath(response.providers.front());
+    StatusOr<ObjectPath> created = behaviour.createdPath(response.providers.front());
     if (created.ok()) {
         response.paths.push_back(std::move(created.value));
     }

@@ -7,11 +7,10 @@
 namespace cimhost {
 
 /**
- * Maps the responses of the providers that performed a request to what its client receives: the results of all
- * providers, in order, or the first failure. A provider that does not support the operation is ignored if another one
- * succeeds. Besides what providers return:
- * CMPI_RC_ERR_FAILED when a provider that succeeds returns other results than the operation has;
- * CMPI_RC_ERR_NOT_FOUND when getInstance succeeds without an instance.
+ * Maps the responses of the providers that performed a request to the response that the client receives: the results of
+ * all providers, in order, or the first failure. A provider that does not support the operation is ignored if another
+ * one succeeds. The status is also CMPI_RC_ERR_FAILED if a provider returned results of the wrong kind, and
+ * CMPI_RC_ERR_NOT_FOUND if getInstance succeeded without an instance.
  */
 Response mapResponses(const ManagerBehaviour& behaviour, const Request& request,
                       std::vector<ProviderResponse> responses);

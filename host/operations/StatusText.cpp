@@ -1,6 +1,6 @@
 #include "operations/StatusText.h"
 
-#include "schema/Text.h"
+#include "schema/StringLiteral.h"
 
 namespace cimhost {
 namespace {
@@ -37,9 +37,9 @@ constexpr Row codes[] = {
     {CMPI_RC_ERROR, "CMPI_RC_ERROR"},
 };
 
-/** The text as one line without control characters. */
-std::string oneLine(const std::string& text) {
-    const std::string escaped = inQuotes(text);
+/** The message on one line, with control characters escaped. */
+std::string oneLine(const std::string& message) {
+    const std::string escaped = inQuotes(message);
     std::string line;
     for (std::size_t i = 1; i + 1 < escaped.size(); ++i) {
         const bool plain = escaped[i] == '\\' && (escaped[i + 1] == '"' || escaped[i + 1] == '\\');

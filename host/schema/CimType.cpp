@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <iterator>
 
-#include "schema/Names.h"
+#include "cim/Names.h"
 
 namespace cimhost {
 namespace {
@@ -46,7 +46,8 @@ std::string_view typeName(CMPIType type) {
 }
 
 std::optional<CMPIType> intrinsicType(std::string_view name) {
-    const TypeRow* row = findType([&](const TypeRow& each) { return each.intrinsic && sameName(each.name, name); });
+    const TypeRow* row =
+        findType([&](const TypeRow& each) { return each.intrinsic && cim::sameName(each.name, name); });
     return row != nullptr ? std::optional(row->type) : std::nullopt;
 }
 

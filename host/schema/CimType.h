@@ -7,10 +7,10 @@
 
 namespace cimhost {
 
-/** MOF's name of a CIM type without its array mark; "reference" and "instance" for the encapsulated ones. */
+/** Name of a CIM type in MOF, without array brackets; "reference" or "instance" for these. */
 std::string_view typeName(CMPIType type);
 
-/** The intrinsic type that MOF calls so, in any letter case; none for another word. References have no such word. */
+/** The intrinsic type of this name in MOF, which ignores letter case; none for other names. */
 std::optional<CMPIType> intrinsicType(std::string_view name);
 
 /** Whether the type is one of the eight integer types. */

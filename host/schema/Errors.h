@@ -5,19 +5,19 @@
 
 namespace cimhost {
 
-/** A file that cannot be read or that says something wrong; the text begins with its name, line and column. */
+/** A file cannot be read or has an error. The message begins with the file's name, line and column. */
 class LoadError : public std::runtime_error {
 public:
     using std::runtime_error::runtime_error;
 };
 
-/** A value that its type cannot take; the text says which value, which type and what would do. */
+/** A value does not have the required type. The message contains the value, the type, and the valid values. */
 class ValueError : public std::runtime_error {
 public:
     using std::runtime_error::runtime_error;
 };
 
-/** A text that is no object path, or a path that its class does not allow. */
+/** A string is not an object path, or the path does not match its class. */
 class PathError : public std::runtime_error {
 public:
     using std::runtime_error::runtime_error;

@@ -4,15 +4,15 @@
 #include <cmath>
 #include <limits>
 
+#include "cim/DateTime.h"
 #include "schema/CimType.h"
 #include "schema/Errors.h"
-#include "schema/Text.h"
 
 namespace cimhost {
 namespace {
 
 [[noreturn]] void refuse(const Literal& literal, CMPIType type, const std::string& remedy) {
-    throw ValueError(literal.text + " is not a " + std::string(typeName(type)) + ": " + remedy);
+    throw ValueError(literal.source + " is not a " + std::string(typeName(type)) + ": " + remedy);
 }
 
 template <typename Integer>
@@ -47,7 +47,7 @@ double realOf(const Literal& literal, CMPIType type) {
 
 template <typename Real>
 Scalar realScalar(const Literal& literal, CMPIType type) {
-    static_assert(std::numeric_limits<Real>::is_iec559);  // what is too large becomes infinite
+    static_assert(std::numeric_limits<Real>::is_iec559);  // an overflow results in infinity
     const Real value = static_cast<Real>(realOf(literal, type));
     if (!std::isfinite(value)) {
         refuse(literal, type, "it is out of range");
@@ -55,12 +55,12 @@ Scalar realScalar(const Literal& literal, CMPIType type) {
     return value;
 }
 
-const std::string& textOf(const Literal& literal, CMPIType type, const std::string& remedy) {
-    const auto* text = std::get_if<std::string>(&literal.value);
-    if (text == nullptr) {
+const std::string& stringOf(const Literal& literal, CMPIType type, const std::string& remedy) {
+    const auto* string = std::get_if<std::string>(&literal.value);
+    if (string == nullptr) {
         refuse(literal, type, remedy);
     }
-    return *text;
+    return *string;
 }
 
 Scalar booleanScalar(const Literal& literal, CMPIType type) {
@@ -80,18 +80,18 @@ Scalar characterScalar(const Literal& literal, CMPIType type) {
 }
 
 Scalar stringScalar(const Literal& literal, CMPIType type) {
-    return textOf(literal, type, "write it in quotation marks, \"" + literal.text + "\"");
+    return stringOf(literal, type, "write it in quotation marks, \"" + literal.source + "\"");
 }
 
 Scalar dateTimeScalar(const Literal& literal, CMPIType type) {
     const std::string remedy =
         "it must be 25 characters, a time such as \"20260131120000.000000+060\" or an interval such as "
         "\"00000007000000.000000:000\"";
-    const std::string& text = textOf(literal, type, remedy);
-    if (!isDateTime(text) && !isNoDateTime(text)) {
+    const std::string& string = stringOf(literal, type, remedy);
+    if (!cim::isDateTime(string) && !cim::isNoDate(string)) {
         refuse(literal, type, remedy);
     }
-    return DateTime{text};
+    return DateTime{string};
 }
 
 struct Converter {

@@ -8,26 +8,26 @@
 
 namespace cimhost {
 
-/** An integer as written, before it is known which type it must fit. */
+/** An integer literal whose type is not known yet. */
 struct IntegerLiteral {
     bool negative = false;
     std::uint64_t magnitude = 0;
     bool tooLarge = false;  ///< the magnitude has more than 64 bits
 };
 
-/** A constant as MOF and object paths write it, before its type is known. std::monostate is NULL. */
+/** A literal of MOF or an object path whose type is not known yet. std::monostate is NULL. */
 struct Literal {
     std::variant<std::monostate, bool, IntegerLiteral, double, Char16, std::string> value{};
-    std::string text{};  ///< as written, for messages
+    std::string source{};  ///< as written, for messages
 };
 
 /**
- * The literal as a value of the type; std::monostate for NULL. References and embedded instances are not made here.
- * ValueError when the literal is of another kind or out of the type's range.
+ * Converts a literal to a type other than a reference or an instance; std::monostate for NULL.
+ * @throws ValueError if the literal is of another kind or out of range
  */
 Scalar typedScalar(const Literal& literal, CMPIType type);
 
-/** The type that a literal has where no class says it: string, boolean, uint64 or sint64, real64, char16. */
+/** The type of a literal that no class declares: string, boolean, uint64 or (negative) sint64, real64, char16. */
 CMPIType literalType(const Literal& literal);
 
 }  // namespace cimhost

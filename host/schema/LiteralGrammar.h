@@ -5,7 +5,7 @@
 
 #include "schema/Literal.h"
 
-/** Constants as MOF and object paths write them: PEGTL rules without white space around them. */
+/** PEGTL rules for the literals of MOF and object paths, without surrounding white space. */
 namespace cimhost::grammar {
 
 namespace peg = tao::pegtl;
@@ -42,19 +42,19 @@ struct Escape : peg::seq<peg::one<'\\'>, peg::sor<UnitEscape, peg::one<'b', 't',
 struct CharacterContent : peg::sor<Escape, peg::utf8::not_one<'\'', '\\', '\n', '\r'>> {};
 struct CharacterLiteral : peg::seq<peg::one<'\''>, CharacterContent, peg::one<'\''>> {};
 
-/** What may stand between quotation marks. Line ends only where the surrounding text is not made of lines. */
+/** The content of a string literal. @tparam Refused characters that end it, such as line ends in MOF */
 template <char... Refused>
 struct StringContent : peg::star<peg::sor<Escape, peg::not_one<'"', '\\', Refused...>>> {};
 
 struct Number : peg::sor<RealLiteral, BinaryLiteral, HexLiteral, OctalLiteral, DecimalLiteral> {};
 struct Word : peg::sor<NullLiteral, TrueLiteral, FalseLiteral> {};
 
-/** Selects the nodes that readLiteral understands. */
+/** Selects the nodes that readLiteral() converts. */
 using LiteralNodes =
     peg::parse_tree::store_content::on<NullLiteral, TrueLiteral, FalseLiteral, RealLiteral, BinaryLiteral, HexLiteral,
                                        OctalLiteral, DecimalLiteral, CharacterContent>;
 
-/** The constant that one of the LiteralNodes stands for. ValueError when a character is none of 16 bits. */
+/** Converts one of the LiteralNodes. @throws ValueError if a character does not have 16 bits */
 Literal readLiteral(const Node& node);
 
 }  // namespace cimhost::grammar

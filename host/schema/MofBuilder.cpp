@@ -15,13 +15,13 @@ namespace {
 namespace mof = grammar::mof;
 using grammar::Node;
 
-[[noreturn]] void fail(const Node& node, const std::string& text) {
+[[noreturn]] void fail(const Node& node, const std::string& message) {
     const auto position = node.begin();
     throw LoadError(position.source + ":" + std::to_string(position.line) + ":" + std::to_string(position.column) +
-                    ": " + text);
+                    ": " + message);
 }
 
-/** Runs the action; what the model finds wrong is reported at the node. */
+/** Runs the action. Rethrows its errors as LoadError with the position of the node. */
 template <typename Action>
 auto at(const Node& node, Action action) {
     try {
@@ -41,7 +41,7 @@ CMPIType readType(const Node& node) {
     const std::optional<CMPIType> type = intrinsicType(node.string_view());
     if (!type) {
         fail(node, node.string() +
-                       " is no data type: expected boolean, string, datetime, char16, uint8 to uint64, "
+                       " is not a data type: expected boolean, string, datetime, char16, uint8 to uint64, "
                        "sint8 to sint64, real32, real64, or a class name followed by REF");
     }
     return *type;
@@ -58,29 +58,29 @@ void applyFlavor(Flavor& flavor, const Node& node) {
         {"ToSubclass", &Flavor::toSubclass, true},      {"ToInstance", &Flavor::toSubclass, true},
         {"Restricted", &Flavor::toSubclass, false},     {"Translatable", &Flavor::translatable, true}};
     for (const Row& row : rows) {
-        if (sameName(row.name, node.string_view())) {
+        if (cim::sameName(row.name, node.string_view())) {
             flavor.*row.member = row.value;
             return;
         }
     }
     fail(node, node.string() +
-                   " is no flavor: expected EnableOverride, DisableOverride, ToSubclass, Restricted or "
+                   " is not a flavor: expected EnableOverride, DisableOverride, ToSubclass, Restricted or "
                    "Translatable");
 }
 
-/** The node's array initialiser or constant. */
+/** The array initializer or constant of a node. */
 const Node* initializerOf(const Node& node) {
     const Node* array = findChild<mof::ArrayInitializer>(node);
     return array != nullptr ? array : findChild<mof::Constant>(node);
 }
 
 const NamedValue* findNamed(const std::vector<NamedValue>& values, std::string_view name) {
-    const auto found =
-        std::find_if(values.begin(), values.end(), [&](const NamedValue& each) { return sameName(each.name, name); });
+    const auto found = std::find_if(values.begin(), values.end(),
+                                    [&](const NamedValue& each) { return cim::sameName(each.name, name); });
     return found == values.end() ? nullptr : &*found;
 }
 
-/** Gives the instance the defaults of its class and its path's keys. */
+/** Adds the default values of the class to an instance, and the keys to its path. */
 void complete(Instance& instance, const Class& declared, const Node& node) {
     for (const Property& property : declared.properties) {
         if (!property.defaultValue.isNull && findNamed(instance.properties, property.name) == nullptr) {
@@ -127,7 +127,7 @@ void MofBuilder::buildDeclaration(const Node& node) {
 }
 
 void MofBuilder::buildPragma(const Node& pragma) {
-    if (sameName(findChild<mof::PragmaName>(pragma)->string_view(), "include")) {
+    if (cim::sameName(findChild<mof::PragmaName>(pragma)->string_view(), "include")) {
         const Literal file = at(pragma, [&] { return constantLiteral(pragma); });
         at(pragma, [&] { include(std::get<std::string>(file.value)); });
     }
@@ -194,7 +194,7 @@ std::vector<Qualifier> MofBuilder::readQualifiers(const Node* list) const {
     }
     for (const Node* node : children<mof::Qualifier>(*list)) {
         Qualifier qualifier = readQualifier(*node);
-        const auto same = [&](const Qualifier& each) { return sameName(each.name, qualifier.name); };
+        const auto same = [&](const Qualifier& each) { return cim::sameName(each.name, qualifier.name); };
         if (std::any_of(qualifiers.begin(), qualifiers.end(), same)) {
             fail(*node, "qualifier " + qualifier.name + " is given twice");
         }
@@ -234,7 +234,7 @@ Value MofBuilder::readValue(const Node& initializer, const Property& type) const
         return value;
     }
     if (!type.isArray) {
-        fail(initializer, type.name + " is no array: expected one value without braces");
+        fail(initializer, type.name + " is not an array: expected one value without braces");
     }
     Value value = Value::array(type.type, {});
     for (const Node* constant : children<mof::Constant>(initializer)) {
@@ -247,10 +247,10 @@ Scalar MofBuilder::readElement(const Node& constant, const Property& type) const
     if (const Node* alias = findChild<mof::Alias>(constant)) {
         const auto known = aliases.find(alias->string_view());
         if (known == aliases.end()) {
-            fail(*alias, alias->string() + " is no alias of an instance declared before");
+            fail(*alias, alias->string() + " is not an alias of an instance declared before");
         }
         if (type.type != CMPI_ref) {
-            fail(*alias, type.name + " is no reference and takes no alias");
+            fail(*alias, type.name + " is not a reference, so its value cannot be an alias");
         }
         return std::make_shared<const ObjectPath>(known->second);
     }

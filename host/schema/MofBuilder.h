@@ -4,20 +4,22 @@
 #include <map>
 #include <string>
 
+#include "cim/Names.h"
 #include "schema/LiteralGrammar.h"
 #include "schema/Schema.h"
 
 namespace cimhost {
 
-/** Turns the parse tree of a MOF text into classes, qualifier declarations and instances of a schema. */
+/** Adds the classes, qualifier declarations and instances of a MOF parse tree to a schema. */
 class MofBuilder {
 public:
-    /** Called for every #pragma include, in its place. */
+    /** Called for each #pragma include, in order. */
     using Include = std::function<void(const std::string& file)>;
 
     MofBuilder(Schema& target, Include onInclude) : schema(target), include(std::move(onInclude)) {}
 
-    /** Builds everything below the root, in order. LoadError with file, line and column at the first mistake. */
+    /** Builds all declarations below the root, in order. @throws LoadError with file, line and column of the first
+     * error */
     void build(const grammar::Node& root);
 
 private:
@@ -36,7 +38,7 @@ private:
 
     Schema& schema;  ///< not owned
     Include include;
-    std::map<std::string, ObjectPath, NameLess> aliases{};
+    std::map<std::string, ObjectPath, cim::NameLess> aliases{};
 };
 
 }  // namespace cimhost

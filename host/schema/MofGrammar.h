@@ -2,12 +2,12 @@
 
 #include "schema/LiteralGrammar.h"
 
-/** The grammar of MOF (CIM 2) as PEGTL rules, bottom up. After what decides for a rule, the rest is a must. */
+/** The grammar of MOF (CIM 2) as PEGTL rules, bottom up. After the first token of a rule, the others are required. */
 namespace cimhost::grammar::mof {
 
 struct LineComment : peg::seq<peg::two<'/'>, peg::until<peg::eolf>> {};
 struct CommentBody : peg::seq<peg::string<'/', '*'>, peg::until<peg::string<'*', '/'>>> {};
-struct ClosedComment : peg::at<CommentBody> {};  // looks ahead, so that a mistake is found at the start
+struct ClosedComment : peg::at<CommentBody> {};  // looks ahead, to report an error at the start of the comment
 struct BlockComment : peg::if_must<peg::at<peg::string<'/', '*'>>, ClosedComment, CommentBody> {};
 struct Skip : peg::star<peg::sor<peg::space, LineComment, BlockComment>> {};
 
@@ -22,7 +22,7 @@ struct NeedMark : peg::must<Mark<C>> {};
 template <typename Item>
 struct CommaList : peg::list_must<Item, Mark<','>> {};
 
-// Constants and initialisers.
+// Constants and initializers.
 struct StringPart : StringContent<'\n', '\r'> {};
 struct StringEnd : peg::one<'"'> {};
 struct StringLiteral : peg::if_must<peg::one<'"'>, StringPart, StringEnd> {};
@@ -108,11 +108,11 @@ struct File : peg::seq<peg::opt<ByteOrderMark>, Skip,
                        peg::star<peg::sor<Pragma, QualifierDeclaration, QualifiedDeclaration, UnqualifiedDeclaration>>,
                        peg::must<FileEnd>> {};
 
-/** An array's initialiser alone, as values are given outside MOF files. */
+/** An array initializer outside of a MOF file. */
 struct LoneArrayEnd : peg::eof {};
 struct LoneArray : peg::seq<Skip, peg::must<ArrayInitializer>, peg::must<LoneArrayEnd>> {};
 
-/** The nodes of which the reader builds its model. */
+/** The nodes that MofBuilder reads. */
 template <typename Rule>
 using Selected = peg::parse_tree::selector<
     Rule, LiteralNodes,

@@ -4,10 +4,10 @@
 
 #include "schema/MofGrammar.h"
 
-/** What a MOF text gets to hear where it goes wrong. */
+/** Error messages of the MOF parser, by rule. */
 namespace cimhost::grammar::mof {
 
-/** What was expected where a must has failed. */
+/** The message if a required rule does not match. */
 template <typename Rule>
 inline constexpr const char* expected = nullptr;
 
@@ -16,10 +16,10 @@ inline constexpr auto expected<ClosedComment> = "this comment is not closed: exp
 template <>
 inline constexpr auto expected<CommentBody> = "this comment is not closed: expected */";
 template <>
-inline constexpr auto expected<StringPart> = "expected text";
+inline constexpr auto expected<StringPart> = "expected the characters of a string";
 template <>
 inline constexpr auto expected<StringEnd> =
-    "this string goes wrong here: expected its closing quotation mark, or one of the escapes \\b \\t \\n \\f \\r \\\" "
+    "this string is wrong here: expected its closing quotation mark, or one of the escapes \\b \\t \\n \\f \\r \\\" "
     "\\' \\\\ \\xHHHH";
 template <>
 inline constexpr auto expected<Constant> =
@@ -109,7 +109,7 @@ struct Errors {
     template <typename Rule>
     static constexpr const char* message = expected<Rule>;
     template <typename Rule>
-    static constexpr bool raise_on_failure = false;  // the rules also stand where they may fail
+    static constexpr bool raise_on_failure = false;  // the rules are also used where they may fail
 };
 template <typename Rule>
 using Control = peg::must_if<Errors>::control<Rule>;

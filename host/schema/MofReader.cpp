@@ -15,18 +15,19 @@ namespace {
 namespace mof = grammar::mof;
 namespace peg = tao::pegtl;
 
-/** std::invalid_argument when there is no such file or it cannot be read. */
-std::string readWhole(const std::filesystem::path& file) {
+/** @throws std::invalid_argument if the file does not exist or cannot be read */
+std::string contentOf(const std::filesystem::path& file) {
     std::error_code error;
     if (!std::filesystem::exists(file, error)) {
         throw std::invalid_argument(file.string() + ": this file does not exist");
     }
     std::ifstream stream(file, std::ios::binary);
-    std::ostringstream text;
-    if (std::filesystem::is_directory(file, error) || !stream || (stream.peek() != EOF && !(text << stream.rdbuf()))) {
+    std::ostringstream content;
+    if (std::filesystem::is_directory(file, error) || !stream ||
+        (stream.peek() != EOF && !(content << stream.rdbuf()))) {
         throw std::invalid_argument(file.string() + ": this file cannot be read");
     }
-    return text.str();
+    return content.str();
 }
 
 std::string message(const peg::parse_error& error) {
@@ -51,12 +52,13 @@ void MofReader::readOnce(const std::filesystem::path& file) {
     if (!error && !filesRead.insert(std::move(same)).second) {
         return;
     }
-    readText(readWhole(file), file.string(), file.parent_path());
+    readSource(contentOf(file), file.string(), file.parent_path());
 }
 
-void MofReader::readText(std::string_view text, const std::string& sourceName, const std::filesystem::path& directory) {
+void MofReader::readSource(std::string_view mof, const std::string& sourceName,
+                           const std::filesystem::path& directory) {
     try {
-        peg::memory_input<> input(text.data(), text.size(), sourceName);
+        peg::memory_input<> input(mof.data(), mof.size(), sourceName);
         const auto root =
             peg::parse_tree::parse<mof::File, grammar::Node, mof::Selected, peg::nothing, mof::Control>(input);
         MofBuilder builder(schema, [&](const std::string& file) { readOnce(directory / file); });

@@ -11,9 +11,8 @@ namespace cimhost {
 
 /**
  * Reads MOF: qualifier declarations, classes, instances, and files named by #pragma include, relative to the
- * file that includes them. A file is read once, however often it is named. Any error is a LoadError with
- * file, line and column. A text with a syntax error adds nothing; after any other error, what stands before it is in
- * the schema.
+ * including file. Each file is read once. Errors are reported as LoadError with file, line and column. After a syntax
+ * error, nothing of the source is added to the schema; after other errors, the declarations before it are.
  */
 class MofReader {
 public:
@@ -21,8 +20,8 @@ public:
 
     void readFile(const std::filesystem::path& file);
 
-    /** @param sourceName stands for the file in messages  @param directory where includes are looked for */
-    void readText(std::string_view text, const std::string& sourceName, const std::filesystem::path& directory = {});
+    /** @param sourceName instead of a file name in messages  @param directory of included files */
+    void readSource(std::string_view mof, const std::string& sourceName, const std::filesystem::path& directory = {});
 
 private:
     void readOnce(const std::filesystem::path& file);

@@ -2,7 +2,7 @@
 
 #include "schema/Errors.h"
 #include "schema/MofMessages.h"
-#include "schema/Text.h"
+#include "schema/StringLiteral.h"
 #include "schema/TypedElement.h"
 
 namespace cimhost {
@@ -13,19 +13,19 @@ namespace peg = tao::pegtl;
 Literal constantLiteral(const grammar::Node& constant) {
     const std::vector<const grammar::Node*> parts = children<mof::StringPart>(constant);
     if (!parts.empty()) {
-        std::string text;
+        std::string value;
         for (const grammar::Node* part : parts) {
-            text += unescaped(part->string_view());
+            value += unescaped(part->string_view());
         }
-        std::string written = inQuotes(text);
-        return {std::move(text), std::move(written)};
+        std::string source = inQuotes(value);
+        return {std::move(value), std::move(source)};
     }
     return grammar::readLiteral(*constant.children.front());
 }
 
-Value parseArray(std::string_view text, const Property& property, const Schema& schema,
+Value parseArray(std::string_view source, const Property& property, const Schema& schema,
                  const std::string& defaultNameSpace) {
-    peg::memory_input<> input(text.data(), text.size(), property.name);
+    peg::memory_input<> input(source.data(), source.size(), property.name);
     try {
         const auto root =
             peg::parse_tree::parse<mof::LoneArray, grammar::Node, mof::Selected, peg::nothing, mof::Control>(input);

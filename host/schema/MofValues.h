@@ -9,7 +9,7 @@
 
 namespace cimhost {
 
-/** The first child of that rule, or null. */
+/** The first child of this rule, or null. */
 template <typename Rule>
 const grammar::Node* findChild(const grammar::Node& node) {
     for (const auto& child : node.children) {
@@ -20,7 +20,7 @@ const grammar::Node* findChild(const grammar::Node& node) {
     return nullptr;
 }
 
-/** All children of that rule. */
+/** All children of this rule. */
 template <typename Rule>
 std::vector<const grammar::Node*> children(const grammar::Node& node) {
     std::vector<const grammar::Node*> found;
@@ -32,14 +32,14 @@ std::vector<const grammar::Node*> children(const grammar::Node& node) {
     return found;
 }
 
-/** The constant of a MOF constant's node; its string parts are joined. An alias is read as if it were NULL. */
+/** The literal of a MOF constant. Adjacent strings are joined. An alias results in NULL. */
 Literal constantLiteral(const grammar::Node& constant);
 
 /**
- * An array value from text in MOF's form, {1, 2} or {"a", "b"}, its elements typed as the property's.
- * ValueError when the text is no such list; the errors of typedElement.
+ * Reads an array in MOF's form, {1, 2} or {"a", "b"}, whose elements have the property's type.
+ * @throws ValueError if the source is not such a list; the errors of typedElement()
  */
-Value parseArray(std::string_view text, const Property& property, const Schema& schema,
+Value parseArray(std::string_view source, const Property& property, const Schema& schema,
                  const std::string& defaultNameSpace);
 
 }  // namespace cimhost

@@ -6,60 +6,61 @@
 #include <cstdio>
 #include <string_view>
 
+#include "cim/Utf8.h"
 #include "schema/ObjectPathText.h"
-#include "schema/Text.h"
+#include "schema/StringLiteral.h"
 
 namespace cimhost {
 namespace {
 
-/** The shortest digits that read back as the same number, with the decimal point that MOF asks for. */
+/** The shortest digits that are read back as the same number, with the decimal point that MOF requires. */
 template <typename Real>
-std::string realText(Real value) {
+std::string formatReal(Real value) {
     if (!std::isfinite(value)) {
-        return "NULL";  // MOF has no word for infinity and for no number
+        return "NULL";  // MOF cannot express infinity and NaN
     }
     std::array<char, 64> digits{};
     const auto end = std::to_chars(digits.data(), digits.data() + digits.size(), value).ptr;
-    std::string text(digits.data(), end);
-    if (text.find('.') == std::string::npos) {
-        text.insert(std::min(text.find('e'), text.size()), ".0");
+    std::string formatted(digits.data(), end);
+    if (formatted.find('.') == std::string::npos) {
+        formatted.insert(std::min(formatted.find('e'), formatted.size()), ".0");
     }
-    return text;
+    return formatted;
 }
 
-std::string characterText(Char16 character) {
+std::string formatCharacter(Char16 character) {
     if (character.code >= 0x20 && character.code < 0x7F && character.code != '\'' && character.code != '\\') {
         return {'\'', static_cast<char>(character.code), '\''};
     }
-    std::array<char, 16> text{};
-    std::snprintf(text.data(), text.size(), "'\\x%04X'", static_cast<unsigned>(character.code));
-    return text.data();
+    std::array<char, 16> literal{};
+    std::snprintf(literal.data(), literal.size(), "'\\x%04X'", static_cast<unsigned>(character.code));
+    return literal.data();
 }
 
-/** Compilers have room for a literal of 1,023 bytes. A character takes up to six. */
+/** Some compilers accept literals of up to 1,023 bytes. A character takes up to six. */
 constexpr std::size_t longestLiteral = 1000;
 
 bool beginsCharacter(char byte) {
     return (static_cast<unsigned char>(byte) & 0xC0U) != 0x80U;
 }
 
-/** How many bytes of a text have room in a literal. */
-std::size_t bytesOfLiteral(std::string_view text) {
+/** The number of bytes of a string that fit into one literal. */
+std::size_t bytesOfLiteral(std::string_view string) {
     std::size_t written = 0;
-    for (std::size_t at = 0; at < text.size(); ++at) {
-        if (written >= longestLiteral && beginsCharacter(text[at])) {
-            return at;
+    for (std::size_t position = 0; position < string.size(); ++position) {
+        if (written >= longestLiteral && beginsCharacter(string[position])) {
+            return position;
         }
-        written += inQuotes(text.substr(at, 1)).size() - 2;
+        written += inQuotes(string.substr(position, 1)).size() - 2;
     }
-    return text.size();
+    return string.size();
 }
 
-/** A text as literals one below the other, which a compiler puts together. */
-std::string inLiterals(std::string_view text) {
-    const std::string whole = wellFormed(text);
+/** A string as one literal per line, which compilers join. */
+std::string inLiterals(std::string_view string) {
+    const std::string valid = cim::replaceInvalidUtf8(string);
     std::string literals;
-    std::string_view rest = whole;
+    std::string_view rest = valid;
     do {
         const std::size_t bytes = bytesOfLiteral(rest);
         literals += (literals.empty() ? "" : "\n        ") + inQuotes(rest.substr(0, bytes));
@@ -70,31 +71,31 @@ std::string inLiterals(std::string_view text) {
 
 using Quote = std::string (*)(std::string_view);
 
-std::string valueText(const Value& value, Quote quote);
+std::string formatValue(const Value& value, Quote quote);
 
-std::string instanceText(const Instance& instance) {
-    std::string text = "instance of " + instance.path.className + " {\n";
+std::string formatInstance(const Instance& instance) {
+    std::string mof = "instance of " + instance.path.className + " {\n";
     for (const NamedValue& property : instance.properties) {
-        text += "    " + property.name + " = " + valueText(property.value, &inLiterals) + ";\n";
+        mof += "    " + property.name + " = " + formatValue(property.value, &inLiterals) + ";\n";
     }
-    return text + "};\n";
+    return mof + "};\n";
 }
 
-struct ScalarText {
+struct ScalarFormat {
     Quote quote;
 
     std::string operator()(std::monostate) const { return "NULL"; }
     std::string operator()(bool value) const { return value ? "TRUE" : "FALSE"; }
-    std::string operator()(Char16 value) const { return characterText(value); }
-    std::string operator()(float value) const { return realText(value); }
-    std::string operator()(double value) const { return realText(value); }
+    std::string operator()(Char16 value) const { return formatCharacter(value); }
+    std::string operator()(float value) const { return formatReal(value); }
+    std::string operator()(double value) const { return formatReal(value); }
     std::string operator()(const std::string& value) const { return quote(value); }
-    std::string operator()(const DateTime& value) const { return quote(value.text); }
+    std::string operator()(const DateTime& value) const { return quote(value.value); }
     std::string operator()(const std::shared_ptr<const ObjectPath>& value) const {
         return value ? quote(formatObjectPath(*value)) : "NULL";
     }
     std::string operator()(const std::shared_ptr<const Instance>& value) const {
-        return value ? quote(instanceText(*value)) : "NULL";
+        return value ? quote(formatInstance(*value)) : "NULL";
     }
     template <typename Integer>
     std::string operator()(Integer value) const {
@@ -102,29 +103,29 @@ struct ScalarText {
     }
 };
 
-std::string valueText(const Value& value, Quote quote) {
+std::string formatValue(const Value& value, Quote quote) {
     if (value.isNull || (!value.isArray && value.elements.empty())) {
         return "NULL";
     }
-    const ScalarText scalar{quote};
+    const ScalarFormat scalar{quote};
     if (!value.isArray) {
         return std::visit(scalar, value.elements.front());
     }
-    std::string text = "{";
+    std::string list = "{";
     for (const Scalar& element : value.elements) {
-        text += (text.size() > 1 ? ", " : "") + std::visit(scalar, element);
+        list += (list.size() > 1 ? ", " : "") + std::visit(scalar, element);
     }
-    return text + "}";
+    return list + "}";
 }
 
 }  // namespace
 
 std::string formatMof(const Value& value) {
-    return valueText(value, &inQuotes);
+    return formatValue(value, &inQuotes);
 }
 
 std::string formatMof(const Instance& instance) {
-    return wellFormed(instanceText(instance));
+    return cim::replaceInvalidUtf8(formatInstance(instance));
 }
 
 }  // namespace cimhost

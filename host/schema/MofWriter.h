@@ -7,14 +7,13 @@
 namespace cimhost {
 
 /**
- * The instance as MOF text, "instance of Class { ... };" with every property in order and a line feed at the end. Bytes
- * that are no UTF-8 become replacement characters. Of a long text each 1,000 bytes or so are a literal of their own:
- * some compilers have no room for more.
+ * Formats an instance as MOF, "instance of Class { ... };" with all properties in order and a line feed at the end.
+ * Bytes that are not UTF-8 become U+FFFD. A string of more than about 1,000 bytes is written as several literals, since
+ * some compilers limit their length.
  */
 std::string formatMof(const Instance& instance);
 
-/** The value as the right side of a MOF assignment: a constant, NULL, or {a, b} for an array. Each text in one piece.
- */
+/** Formats a value as in a MOF assignment: a constant, NULL, or {a, b} for an array. Each string is one literal. */
 std::string formatMof(const Value& value);
 
 }  // namespace cimhost

@@ -4,7 +4,7 @@
 
 #include "schema/LiteralGrammar.h"
 
-/** Object paths as untyped WBEM URIs: [//host/][namespace:]Class[.Key=value,...]. No white space between the parts. */
+/** PEGTL rules for untyped WBEM URIs, [//host/][namespace:]Class[.Key=value,...], without white space. */
 namespace cimhost::grammar::path {
 
 struct Host : peg::plus<peg::not_one<'/'>> {};
@@ -28,7 +28,7 @@ struct PathEnd : peg::eof {};
 struct Path : peg::seq<peg::sor<HostPart, peg::opt<peg::one<'/'>>>, peg::opt<NameSpacePart>, peg::must<ClassName>,
                        peg::opt<Keys>, peg::must<PathEnd>> {};
 
-/** A constant alone, as values are given on a command line. */
+/** A literal on a command line. */
 struct LoneConstant : peg::seq<peg::sor<Word, Number, CharacterLiteral>, peg::eof> {};
 
 template <typename Rule>

@@ -2,12 +2,13 @@
 
 #include <algorithm>
 
+#include "cim/Names.h"
 #include "schema/CimType.h"
 #include "schema/Errors.h"
 #include "schema/MofValues.h"
 #include "schema/MofWriter.h"
 #include "schema/ObjectPathGrammar.h"
-#include "schema/Text.h"
+#include "schema/StringLiteral.h"
 #include "schema/TypedElement.h"
 
 namespace cimhost {
@@ -20,7 +21,7 @@ using grammar::Node;
 template <typename Rule>
 inline constexpr const char* expected = nullptr;
 template <>
-inline constexpr auto expected<path::Host> = "expected the name of a host after //";
+inline constexpr auto expected<path::Host> = "expected a host name after //";
 template <>
 inline constexpr auto expected<path::HostEnd> = "expected / after the host";
 template <>
@@ -29,21 +30,21 @@ inline constexpr auto expected<path::ClassName> =
 template <>
 inline constexpr auto expected<path::Key> = "expected Key=value";
 template <>
-inline constexpr auto expected<path::KeyName> = "expected the name of a key";
+inline constexpr auto expected<path::KeyName> = "expected a key name";
 template <>
-inline constexpr auto expected<path::Equals> = "expected = after the name of a key";
+inline constexpr auto expected<path::Equals> = "expected = after the key name";
 template <>
 inline constexpr auto expected<path::KeyValue> =
     "expected a key's value: a string in quotation marks (a shell needs quotes around the whole path to keep them), a "
     "number, true or false";
 template <>
-inline constexpr auto expected<path::StringPart> = "expected text";
+inline constexpr auto expected<path::StringPart> = "expected the characters of a string";
 template <>
 inline constexpr auto expected<path::StringEnd> =
-    "expected the closing quotation mark; inside of them a quotation mark is written \\\" and a backslash \\\\";
+    "expected the closing quotation mark; in the string, write \\\" for a quotation mark and \\\\ for a backslash";
 template <>
 inline constexpr auto expected<path::PathEnd> =
-    "expected the end of the path, or . and Key=value after the class, or a comma and a further key";
+    "expected the end of the path, . and Key=value after the class, or a comma and another key";
 
 struct Errors {
     template <typename Rule>
@@ -55,13 +56,13 @@ template <typename Rule>
 using Control = peg::must_if<Errors>::control<Rule>;
 
 Literal readKeyValue(const Node& node) {
-    if (const Node* text = findChild<path::StringPart>(node)) {
-        return {unescaped(text->string_view()), node.string()};
+    if (const Node* content = findChild<path::StringPart>(node)) {
+        return {unescaped(content->string_view()), node.string()};
     }
     return grammar::readLiteral(*node.children.front());
 }
 
-/** The key's property; null when the class is not known. PathError when the class has no such key. */
+/** The property of a key; null if the class is unknown. @throws PathError if the class does not have the key */
 const Property* findKey(const Class* known, std::string_view name) {
     if (known == nullptr) {
         return nullptr;
@@ -75,7 +76,7 @@ const Property* findKey(const Class* known, std::string_view name) {
         keys += (keys.empty() ? "" : ", ") + key->name;
     }
     throw PathError("class " + known->name + " has no key " + std::string(name) +
-                    (keys.empty() ? "; it has no keys at all" : "; its keys are " + keys));
+                    (keys.empty() ? "; it has no keys" : "; its keys are " + keys));
 }
 
 Value keyValue(const Literal& literal, const std::string& name, const Property* key, const Schema& schema,
@@ -97,7 +98,7 @@ Value keyValue(const Literal& literal, const std::string& name, const Property* 
 void addKey(ObjectPath& result, const Node& node, const Class* known, const Schema& schema,
             const std::string& defaultNameSpace) {
     const std::string name = findChild<path::KeyName>(node)->string();
-    const auto same = [&](const NamedValue& key) { return sameName(key.name, name); };
+    const auto same = [&](const NamedValue& key) { return cim::sameName(key.name, name); };
     if (std::any_of(result.keys.begin(), result.keys.end(), same)) {
         throw PathError("key " + name + " is given twice");
     }
@@ -121,10 +122,10 @@ ObjectPath buildPath(const Node& root, const Schema& schema, const std::string& 
 
 }  // namespace
 
-ObjectPath parseObjectPath(std::string_view text, const Schema& schema, const std::string& defaultNameSpace) {
-    const std::string intro = "object path " + std::string(text) + ": ";
+ObjectPath parseObjectPath(std::string_view uri, const Schema& schema, const std::string& defaultNameSpace) {
+    const std::string intro = "object path " + std::string(uri) + ": ";
     try {
-        peg::memory_input<> input(text.data(), text.size(), "");
+        peg::memory_input<> input(uri.data(), uri.size(), "");
         const auto root = peg::parse_tree::parse<path::Path, Node, path::Selected, peg::nothing, Control>(input);
         return buildPath(*root, schema, defaultNameSpace);
     } catch (const peg::parse_error& error) {
@@ -138,20 +139,20 @@ ObjectPath parseObjectPath(std::string_view text, const Schema& schema, const st
 }
 
 std::string formatObjectPath(const ObjectPath& path) {
-    std::string text;
+    std::string uri;
     if (!path.host.empty()) {
-        text = "//" + path.host + "/";
+        uri = "//" + path.host + "/";
     }
     if (!path.nameSpace.empty()) {
-        text += path.nameSpace + ":";
+        uri += path.nameSpace + ":";
     }
-    text += path.className;
+    uri += path.className;
     char separator = '.';
     for (const NamedValue& key : path.keys) {
-        text += separator + key.name + "=" + formatMof(key.value);
+        uri += separator + key.name + "=" + formatMof(key.value);
         separator = ',';
     }
-    return text;
+    return uri;
 }
 
 }  // namespace cimhost

@@ -9,17 +9,17 @@
 namespace cimhost {
 
 /**
- * Reads an object path written as an untyped WBEM URI: [//host/][namespace:]Class[.Key=value,...].
- * Values are quoted strings, integers, true and false; a reference is a quoted path. Keys take the types that
- * the class gives them; of a class that the schema does not know, strings, uint64 or sint64, real64 and booleans.
- * Not all keys need be there. PathError when the text is no path, names a key that the class does not have or
- * has it twice, or when a value does not fit its key's type.
+ * Reads an untyped WBEM URI: [//host/][namespace:]Class[.Key=value,...]. Values are quoted strings, numbers, true and
+ * false; a reference is a quoted path. Keys have the types that the class declares; those of an unknown class are
+ * strings, uint64 or (negative) sint64, real64 and booleans. Keys may be missing.
  *
- * @param defaultNameSpace for a path, also a referenced one, that names none
+ * @param defaultNameSpace of paths, and of references, without a namespace
+ * @throws PathError if the string is not a path, the class does not have a key, a key occurs twice, or a value does not
+ * match its key's type
  */
-ObjectPath parseObjectPath(std::string_view text, const Schema& schema, const std::string& defaultNameSpace);
+ObjectPath parseObjectPath(std::string_view uri, const Schema& schema, const std::string& defaultNameSpace);
 
-/** The path as text that parseObjectPath reads back. A null key value, which no path should have, is written NULL. */
+/** Formats a path as parseObjectPath() reads it. A null key value, which is not valid, is written as NULL. */
 std::string formatObjectPath(const ObjectPath& path);
 
 }  // namespace cimhost

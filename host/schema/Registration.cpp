@@ -4,20 +4,20 @@
 #include <fstream>
 #include <sstream>
 
+#include "cim/Names.h"
 #include "schema/Errors.h"
-#include "schema/Names.h"
 
 namespace cimhost {
 namespace {
 
-std::string trimmed(const std::string& text) {
+std::string trimmed(const std::string& string) {
     constexpr auto blanks = " \t\r\n\f\v";
-    const std::size_t first = text.find_first_not_of(blanks);
-    return first == std::string::npos ? "" : text.substr(first, text.find_last_not_of(blanks) - first + 1);
+    const std::size_t first = string.find_first_not_of(blanks);
+    return first == std::string::npos ? "" : string.substr(first, string.find_last_not_of(blanks) - first + 1);
 }
 
-std::vector<std::string> words(const std::string& text) {
-    std::istringstream stream(text);
+std::vector<std::string> words(const std::string& string) {
+    std::istringstream stream(string);
     std::vector<std::string> found;
     for (std::string word; stream >> word;) {
         found.push_back(word);
@@ -25,57 +25,57 @@ std::vector<std::string> words(const std::string& text) {
     return found;
 }
 
-/** Reads one file: the stanzas so far, and the line it is at. */
+/** Reads the lines of one file. */
 class RegistrationReader {
 public:
     explicit RegistrationReader(std::string name) : sourceName(std::move(name)) {}
 
     void readLine(const std::string& line) {
         ++lineNumber;
-        const std::string text = trimmed(line);
-        if (text.empty() || text.front() == '#') {
+        const std::string content = trimmed(line);
+        if (content.empty() || content.front() == '#') {
             return;
         }
-        if (text.front() == '[') {
-            startStanza(text);
+        if (content.front() == '[') {
+            startSection(content);
         } else {
-            readKeyword(text);
+            readKeyword(content);
         }
     }
 
     std::vector<ProviderRegistration> finish() {
-        checkStanza();
-        return std::move(stanzas);
+        checkSection();
+        return std::move(sections);
     }
 
 private:
-    [[noreturn]] void fail(const std::string& text) const {
-        throw LoadError(sourceName + ":" + std::to_string(lineNumber) + ": " + text);
+    [[noreturn]] void fail(const std::string& message) const {
+        throw LoadError(sourceName + ":" + std::to_string(lineNumber) + ": " + message);
     }
 
-    void startStanza(const std::string& text) {
-        checkStanza();
-        if (text.back() != ']') {
+    void startSection(const std::string& line) {
+        checkSection();
+        if (line.back() != ']') {
             fail("expected ] at the end of [CLASS]");
         }
-        ProviderRegistration stanza;
-        stanza.className = trimmed(text.substr(1, text.size() - 2));
-        if (!isName(stanza.className)) {
+        ProviderRegistration section;
+        section.className = trimmed(line.substr(1, line.size() - 2));
+        if (!cim::isName(section.className)) {
             fail("expected a class name in [ ]");
         }
-        stanza.source = sourceName + ":" + std::to_string(lineNumber);
-        stanzas.push_back(std::move(stanza));
+        section.source = sourceName + ":" + std::to_string(lineNumber);
+        sections.push_back(std::move(section));
     }
 
-    void readKeyword(const std::string& text) {
-        const std::size_t colon = text.find(':');
+    void readKeyword(const std::string& line) {
+        const std::size_t colon = line.find(':');
         if (colon == std::string::npos) {
             fail("expected [CLASS], \"keyword: value\" or #");
         }
-        if (stanzas.empty()) {
+        if (sections.empty()) {
             fail("expected [CLASS] before the first keyword");
         }
-        apply(foldedName(trimmed(text.substr(0, colon))), trimmed(text.substr(colon + 1)));
+        apply(cim::foldedName(trimmed(line.substr(0, colon))), trimmed(line.substr(colon + 1)));
     }
 
     void apply(const std::string& keyword, const std::string& value) {
@@ -87,17 +87,17 @@ private:
                                 {"location", &ProviderRegistration::location},
                                 {"group", &ProviderRegistration::group},
                                 {"unload", &ProviderRegistration::unload}};
-        ProviderRegistration& stanza = stanzas.back();
+        ProviderRegistration& section = sections.back();
         for (const Row& row : rows) {
             if (keyword == row.keyword) {
-                stanza.*row.member = oneWord(keyword, value);
+                section.*row.member = oneWord(keyword, value);
             }
         }
         if (keyword == "type") {
-            readTypes(stanza, value);
+            readTypes(section, value);
         } else if (keyword == "namespace") {
             const std::vector<std::string> names = words(value);
-            stanza.nameSpaces.insert(stanza.nameSpaces.end(), names.begin(), names.end());
+            section.nameSpaces.insert(section.nameSpaces.end(), names.begin(), names.end());
         }
     }
 
@@ -108,32 +108,33 @@ private:
         return value;
     }
 
-    static void readTypes(ProviderRegistration& stanza, const std::string& value) {
+    static void readTypes(ProviderRegistration& section, const std::string& value) {
         for (const std::string& type : words(value)) {
-            stanza.instance = stanza.instance || sameName(type, "instance");
-            stanza.association = stanza.association || sameName(type, "association");
+            section.instance = section.instance || cim::sameName(type, "instance");
+            section.association = section.association || cim::sameName(type, "association");
         }
     }
 
-    /** A stanza that names no provider, library, namespace or served type is of no use to anybody. */
-    void checkStanza() const {
-        if (stanzas.empty()) {
+    /** @throws LoadError if the last section lacks a provider, a library or namespaces */
+    void checkSection() const {
+        if (sections.empty()) {
             return;
         }
-        const ProviderRegistration& stanza = stanzas.back();
-        const auto need = [&](bool there, const char* what) {
-            if (!there) {
-                throw LoadError(stanza.source + ": the stanza [" + stanza.className + "] has no line \"" + what + "\"");
+        const ProviderRegistration& section = sections.back();
+        const auto require = [&](bool isPresent, const char* line) {
+            if (!isPresent) {
+                throw LoadError(section.source + ": the section [" + section.className + "] has no line \"" + line +
+                                "\"");
             }
         };
-        need(!stanza.provider.empty(), "provider: NAME");
-        need(!stanza.location.empty(), "location: LIBRARY");
-        need(!stanza.nameSpaces.empty(), "namespace: root/cimv2");
+        require(!section.provider.empty(), "provider: NAME");
+        require(!section.location.empty(), "location: LIBRARY");
+        require(!section.nameSpaces.empty(), "namespace: root/cimv2");
     }
 
     std::string sourceName;
     unsigned long lineNumber = 0;
-    std::vector<ProviderRegistration> stanzas{};
+    std::vector<ProviderRegistration> sections{};
 };
 
 }  // namespace
@@ -150,12 +151,12 @@ std::vector<ProviderRegistration> readRegistrationFile(const std::filesystem::pa
     return readRegistrations(stream, file.string());
 }
 
-std::vector<ProviderRegistration> readRegistrations(std::istream& text, const std::string& sourceName) {
+std::vector<ProviderRegistration> readRegistrations(std::istream& stream, const std::string& sourceName) {
     RegistrationReader reader(sourceName);
-    for (std::string line; std::getline(text, line);) {
+    for (std::string line; std::getline(stream, line);) {
         reader.readLine(line);
     }
-    if (text.bad()) {
+    if (stream.bad()) {
         throw LoadError(sourceName + ": this file cannot be read");
     }
     return reader.finish();

@@ -12,7 +12,7 @@ namespace {
 template <typename Element>
 const Element* findNamed(const std::vector<Element>& elements, std::string_view name) {
     const auto found = std::find_if(elements.begin(), elements.end(),
-                                    [&](const Element& element) { return sameName(element.name, name); });
+                                    [&](const Element& element) { return cim::sameName(element.name, name); });
     return found == elements.end() ? nullptr : &*found;
 }
 
@@ -32,15 +32,15 @@ void inheritQualifiers(std::vector<Qualifier>& own, const std::vector<Qualifier>
     }
 }
 
-std::string typeText(const Property& property) {
+std::string typeOf(const Property& property) {
     return (property.type == CMPI_ref ? property.referenceClass + " REF" : std::string(typeName(property.type))) +
            (property.isArray ? "[]" : "");
 }
 
 void checkOverride(const Class& declared, const Property& own, const Property& inherited) {
     if (own.type != inherited.type || own.isArray != inherited.isArray) {
-        throw std::invalid_argument("property " + declared.name + "." + own.name + " is " + typeText(own) + ", but " +
-                                    inherited.origin + " declares it as " + typeText(inherited));
+        throw std::invalid_argument("property " + declared.name + "." + own.name + " is " + typeOf(own) + ", but " +
+                                    inherited.origin + " declares it as " + typeOf(inherited));
     }
 }
 
@@ -48,7 +48,7 @@ template <typename Element>
 void checkUnique(const Class& declared, const std::vector<Element>& elements, const char* kind) {
     for (std::size_t i = 0; i < elements.size(); ++i) {
         for (std::size_t j = 0; j < i; ++j) {
-            if (sameName(elements[i].name, elements[j].name)) {
+            if (cim::sameName(elements[i].name, elements[j].name)) {
                 throw std::invalid_argument("class " + declared.name + " declares the " + kind + " " +
                                             elements[i].name + " twice");
             }
@@ -56,12 +56,12 @@ void checkUnique(const Class& declared, const std::vector<Element>& elements, co
     }
 }
 
-/** The superclass's properties with the overriding ones in their places, then the class's further ones. */
+/** The properties of the superclass, overridden by those of the class, then the other properties of the class. */
 std::vector<Property> mergeProperties(const Class& declared, const Class& super) {
     std::vector<Property> merged = super.properties;
     for (const Property& own : declared.properties) {
         const auto inherited = std::find_if(merged.begin(), merged.end(),
-                                            [&](const Property& each) { return sameName(each.name, own.name); });
+                                            [&](const Property& each) { return cim::sameName(each.name, own.name); });
         if (inherited == merged.end()) {
             merged.push_back(own);
             continue;
@@ -136,7 +136,7 @@ std::vector<const Class*> Schema::classes() const {
 }
 
 bool Schema::isA(std::string_view name, std::string_view ancestor) const {
-    if (sameName(name, ancestor)) {
+    if (cim::sameName(name, ancestor)) {
         return true;
     }
     const Class* known = findClass(name);
@@ -146,7 +146,7 @@ bool Schema::isA(std::string_view name, std::string_view ancestor) const {
 std::vector<const Class*> Schema::subclasses(std::string_view name) const {
     std::vector<const Class*> found;
     std::copy_if(inOrder.begin(), inOrder.end(), std::back_inserter(found),
-                 [&](const Class* each) { return !sameName(each->name, name) && isA(each->name, name); });
+                 [&](const Class* each) { return !cim::sameName(each->name, name) && isA(each->name, name); });
     return found;
 }
 

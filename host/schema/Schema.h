@@ -6,33 +6,33 @@
 #include <string_view>
 #include <vector>
 
+#include "cim/Names.h"
 #include "model/Value.h"
-#include "schema/Names.h"
 
 namespace cimhost {
 
-/** How a qualifier travels to subclasses and whether they may change it. */
+/** Whether a qualifier is inherited, and whether subclasses may override it. */
 struct Flavor {
     bool toSubclass = true;   ///< inherited by subclasses and overriding properties
-    bool overridable = true;  ///< may be given another value there
+    bool overridable = true;  ///< they may change its value
     bool translatable = false;
 };
 
-/** A qualifier as a class, property or method bears it, its own or inherited. */
+/** A qualifier of a class or property, declared there or inherited. */
 struct Qualifier {
     std::string name{};
     Value value{};
     Flavor flavor{};
 };
 
-/** Declaration of a qualifier: what type its values have and what holds where none is given. */
+/** Declaration of a qualifier: type and default value. */
 struct QualifierDeclaration {
     std::string name{};
     CMPIType type = CMPI_boolean;
     bool isArray = false;
     Value defaultValue{};
     Flavor flavor{};
-    bool standard = false;  ///< known to every object manager; a MOF file may still declare it
+    bool standard = false;  ///< declared by the CIM standard; a MOF file may declare it again
 };
 
 /** A property or reference of a class. */
@@ -40,7 +40,7 @@ struct Property {
     std::string name{};
     CMPIType type = CMPI_null;  ///< element type; CMPI_ref for a reference
     bool isArray = false;
-    std::string referenceClass{};  ///< class that a reference points to; empty otherwise
+    std::string referenceClass{};  ///< of a reference, the class that it refers to; empty otherwise
     Value defaultValue{};          ///< of the property's type; null without a default
     std::vector<Qualifier> qualifiers{};
     std::string origin{};  ///< name of the class that declares it
@@ -48,20 +48,20 @@ struct Property {
     const Qualifier* findQualifier(std::string_view qualifier) const;
     bool isKey() const;
 
-    /** Whether clients may modify it: the qualifier Write is true. */
+    /** Whether clients may modify it: its qualifier Write is true. */
     bool isWritable() const;
 };
 
-/** A method by its name; this host does not call methods. */
+/** The name of a method; this host does not call methods. */
 struct Method {
     std::string name{};
     std::string origin{};
 };
 
-/** A class with all its properties: the inherited ones first, then its own, each in the order declared. */
+/** A class with all its properties: inherited ones first, then those it declares, in the order of declaration. */
 struct Class {
     std::string name{};
-    std::string superclass{};  ///< empty at the root
+    std::string superclass{};  ///< empty: none
     std::vector<Qualifier> qualifiers{};
     std::vector<Property> properties{};
     std::vector<Method> methods{};
@@ -73,47 +73,47 @@ struct Class {
 };
 
 /**
- * The classes, qualifier declarations and instances that MOF files have given. One set for all
- * namespaces. Names ignore letter case. Pointers and references to classes stay good as long as the
- * schema lives. Not synchronised: fill it, then share it for reading.
+ * The classes, qualifier declarations and instances of MOF files, for all namespaces. Names are case-insensitive.
+ * Pointers and references to classes are valid for the lifetime of the schema. Concurrent reading is safe.
  */
 class Schema {
 public:
-    /** Knows the standard qualifiers from the start. */
+    /** Contains the standard qualifiers. */
     Schema();
 
-    /** The class of that name, or null. */
+    /** The class of this name, or null. */
     const Class* findClass(std::string_view name) const;
 
     /** All classes in the order in which they were added. */
     std::vector<const Class*> classes() const;
 
-    /** Whether the class is the other one or descends from it. A class that is not known is only itself. */
+    /** Whether a class is the ancestor or derived from it. An unknown class has no ancestors. */
     bool isA(std::string_view name, std::string_view ancestor) const;
 
-    /** The class's direct and indirect subclasses, itself not among them, in the order added. */
+    /** The direct and indirect subclasses of a class, in the order in which they were added. */
     std::vector<const Class*> subclasses(std::string_view name) const;
 
     /**
-     * Adds a class that carries only its own properties and methods, and completes it with what it inherits.
-     * std::invalid_argument when the class is there already, the superclass is not, a property comes twice,
-     * or an overriding property has another type.
+     * Adds a class and the elements that it inherits.
+     * @param declared with only the properties and methods that it declares
+     * @throws std::invalid_argument if the class exists, its superclass does not, a property is declared twice, or an
+     * overriding property has another type
      */
     const Class& add(Class declared);
 
     const QualifierDeclaration* findQualifier(std::string_view name) const;
 
-    /** Adds a declaration; a standard one may be given again, any other with the same name is std::invalid_argument. */
+    /** Adds a declaration. @throws std::invalid_argument if it exists and is not that of a standard qualifier */
     void add(QualifierDeclaration declaration);
 
-    /** Instances that MOF files declare ("instance of"), in order. */
+    /** The instances of MOF files ("instance of"), in order. */
     const std::vector<Instance>& instances() const { return declaredInstances; }
     void add(Instance instance) { declaredInstances.push_back(std::move(instance)); }
 
 private:
-    std::map<std::string, std::unique_ptr<const Class>, NameLess> byName;
+    std::map<std::string, std::unique_ptr<const Class>, cim::NameLess> byName;
     std::vector<const Class*> inOrder;
-    std::map<std::string, QualifierDeclaration, NameLess> qualifierDeclarations;
+    std::map<std::string, QualifierDeclaration, cim::NameLess> qualifierDeclarations;
     std::vector<Instance> declaredInstances;
 };
 

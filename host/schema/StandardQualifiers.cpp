@@ -4,8 +4,8 @@ namespace cimhost {
 namespace {
 
 constexpr Flavor open{true, true, false};         // inherited, may be overridden
-constexpr Flavor fixed{true, false, false};       // inherited as it is
-constexpr Flavor restricted{false, true, false};  // holds only where it stands
+constexpr Flavor fixed{true, false, false};       // inherited, may not be overridden
+constexpr Flavor restricted{false, true, false};  // not inherited
 constexpr Flavor translatable{true, true, true};
 
 struct Row {

@@ -6,7 +6,7 @@
 
 namespace cimhost {
 
-/** Declarations of the qualifiers that every CIM implementation knows, so that a MOF file may use them undeclared. */
+/** Declarations of the CIM standard's qualifiers, which MOF files may use without declaring them. */
 std::vector<QualifierDeclaration> standardQualifiers();
 
 }  // namespace cimhost

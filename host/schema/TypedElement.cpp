@@ -8,12 +8,12 @@ namespace {
 
 Scalar reference(const Literal& literal, const Property& property, const Schema& schema,
                  const std::string& defaultNameSpace) {
-    const auto* text = std::get_if<std::string>(&literal.value);
-    if (text == nullptr) {
-        throw ValueError(literal.text + " is no reference: write the path of a " + property.referenceClass +
+    const auto* uri = std::get_if<std::string>(&literal.value);
+    if (uri == nullptr) {
+        throw ValueError(literal.source + " is not a reference: write the path of a " + property.referenceClass +
                          " in quotation marks, such as \"" + property.referenceClass + ".Key=\\\"x\\\"\"");
     }
-    auto path = std::make_shared<ObjectPath>(parseObjectPath(*text, schema, defaultNameSpace));
+    auto path = std::make_shared<ObjectPath>(parseObjectPath(*uri, schema, defaultNameSpace));
     const bool known = schema.findClass(path->className) != nullptr && schema.findClass(property.referenceClass);
     if (known && !schema.isA(path->className, property.referenceClass)) {
         throw ValueError(property.name + " must refer to a " + property.referenceClass + ", not to a " +

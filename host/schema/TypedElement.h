@@ -8,10 +8,10 @@
 namespace cimhost {
 
 /**
- * The literal as one element of the property's value; a reference is read from a string that holds its path.
- * ValueError or PathError when it does not fit the property's type or the class that a reference points to.
+ * Converts a literal to an element of a property's value. The literal of a reference is a string with its path.
  *
- * @param defaultNameSpace for a reference that names none
+ * @param defaultNameSpace of a reference without a namespace
+ * @throws ValueError, PathError if it does not match the property's type or the class of the reference
  */
 Scalar typedElement(const Literal& literal, const Property& property, const Schema& schema,
                     const std::string& defaultNameSpace);

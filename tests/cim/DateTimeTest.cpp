@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 using cim::formatPointInTime;
+using cim::isDateTime;
 using cim::isInterval;
 using cim::isPointInTime;
 
@@ -60,6 +61,8 @@ TEST(CimDateTime, FormatsAPointInTimeWithAnOffset) {
     EXPECT_EQ(formatPointInTime(1700000000, 345), "20231115035820.000000+345");
     EXPECT_EQ(formatPointInTime(1700000000, -210), "20231114184320.000000-210");
     EXPECT_EQ(formatPointInTime(-1, 0), "19691231235959.000000+000");
+    EXPECT_EQ(formatPointInTime(0, 0, 1), "19700101000000.000001+000");
+    EXPECT_EQ(formatPointInTime(-1, -210, 999999), "19691231202959.999999-210");
 }
 
 TEST(CimDateTime, FormatsNoYearsBelow0OrAbove9999) {
@@ -73,19 +76,39 @@ TEST(CimDateTime, FormatsNoYearsBelow0OrAbove9999) {
 }
 
 TEST(CimDateTime, MayHaveAsterisksFromSomeFieldOn) {
-    for (const char* string : {"20240101******.******+000", "20240101000000.123***-060"}) {
-        EXPECT_TRUE(cim::isDateTime(string)) << string;
+    for (const char* string : {"20240101******.******+000", "20240101000000.123***-060", "20260131******.******+000",
+                               "2026**********.******+000", "**************.******+000"}) {
+        EXPECT_TRUE(isDateTime(string)) << string;
         EXPECT_FALSE(isPointInTime(string)) << string;
     }
-    EXPECT_TRUE(cim::isDateTime("00000010******.******:000"));
-    EXPECT_FALSE(isInterval("00000010******.******:000"));
-    EXPECT_FALSE(cim::isDateTime("2024**01000000.000000+000"));
-    EXPECT_FALSE(cim::isDateTime("202401010000**.000000+000"));
+    for (const char* string : {"00000010******.******:000", "0000001012****.******:000"}) {
+        EXPECT_TRUE(isDateTime(string)) << string;
+        EXPECT_FALSE(isInterval(string)) << string;
+    }
+}
+
+TEST(CimDateTime, HasNoAsterisksBeforeDigitsInsideAFieldOrInTheOffset) {
+    for (const char* string : {"2024**01000000.000000+000", "202401010000**.000000+000", "2026013112000*.******+000",
+                               "20260131120000.1*0000+000", "20260131120000.000000+***"}) {
+        EXPECT_FALSE(isDateTime(string)) << string;
+    }
+}
+
+TEST(CimDateTime, IsNoOtherString) {
+    for (const char* string : {"", "2026-01-31", "20260131120000.000000+06", "20260131120000.000000+0600",
+                               "20260131120000,000000+060", "20260131120000.000000 060", "2026013112000x.000000+060",
+                               "20260131120000.00000x+060", "20260131120000.000000+0x0", "00000001250000.000000:000",
+                               "00000001120000.000000:060", "21000229120000.000000+000", "00000000000000.000000-000"}) {
+        EXPECT_FALSE(isDateTime(string)) << string;
+    }
+    EXPECT_TRUE(isDateTime("00000000000000.000000:000"));
 }
 
 TEST(CimDateTime, HasAConstantForNoDate) {
     EXPECT_TRUE(cim::isNoDate(cim::noDate));
     EXPECT_TRUE(cim::isNoDate("00000000000000.000000+000"));
     EXPECT_FALSE(cim::isNoDate("00000101000000.000000+000"));
+    EXPECT_FALSE(cim::isNoDate("00000000000000.000000+060"));
+    EXPECT_FALSE(cim::isNoDate("00000000000000.000000:000"));
     EXPECT_FALSE(cim::isNoDate(""));
 }

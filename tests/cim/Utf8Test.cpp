@@ -72,3 +72,23 @@ TEST(Utf8, IsInvalidFromTheFirstByteOfABrokenCharacter) {
     EXPECT_EQ(cim::findInvalidUtf8("a\xC3\xA9\xE2\x82\xAC"), std::string_view::npos);
     EXPECT_EQ(cim::findInvalidUtf8("a\xC3\xA9\xE2\x82"), 3U);
 }
+
+TEST(Utf8, IsMadeOfAnyBytesByReplacementCharacters) {
+    struct {
+        const char* bytes;
+        const char* replaced;
+    } const cases[] = {
+        {"", ""},
+        {"a\xC3\xA9\xE2\x82\xAC", "a\xC3\xA9\xE2\x82\xAC"},
+        {"a\xFF\xC0\x80z", "a\uFFFD\uFFFD\uFFFDz"},
+        {"\xE2\x82z", "\uFFFDz"},                            // truncated
+        {"\xED\xA0\x80z", "\uFFFD\uFFFD\uFFFDz"},            // a surrogate
+        {"\xE0\x80\x80z", "\uFFFD\uFFFD\uFFFDz"},            // overlong
+        {"\xF4\x90\x80\x80z", "\uFFFD\uFFFD\uFFFD\uFFFDz"},  // beyond the last character
+        {"z\xF0\x9F\x98", "z\uFFFD"},
+        {"z\xF0\x9F", "z\uFFFD"},
+    };
+    for (const auto& each : cases) {
+        EXPECT_EQ(cim::replaceInvalidUtf8(each.bytes), each.replaced);
+    }
+}

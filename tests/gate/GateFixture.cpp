@@ -64,7 +64,7 @@ std::optional<std::string> valueIn(const Instance& instance, const std::string& 
     if (value == nullptr || value->isNull) {
         return std::nullopt;
     }
-    if (const auto characters = testsupport::textOf(properties, property)) {
+    if (const auto characters = testsupport::stringOf(properties, property)) {
         return characters;
     }
     const auto date = testsupport::dateTimeOf(properties, property);
@@ -74,7 +74,7 @@ std::optional<std::string> valueIn(const Instance& instance, const std::string& 
 std::vector<std::string> identifiersOf(const std::vector<ObjectPath>& paths) {
     std::vector<std::string> identifiers;
     for (const ObjectPath& path : paths) {
-        identifiers.push_back(testsupport::textOf(path.keys, "InstanceID").value_or("(none)"));
+        identifiers.push_back(testsupport::stringOf(path.keys, "InstanceID").value_or("(none)"));
     }
     return identifiers;
 }

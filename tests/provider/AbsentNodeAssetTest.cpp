@@ -4,32 +4,37 @@
 
 #include <gmock/gmock.h>
 
-#if defined(AGENT_WITHOUT_COMPUTER)
-constexpr bool hasComputer = false;
-const char* const agentNodes = R"(
-[[instrumentation.node]]
-type = 1
-path = "/system"
-properties = { "36" = "Example Maker", "108" = "the system" }
-)";
-#elif defined(AGENT_WITHOUT_SYSTEM)
-constexpr bool hasComputer = true;
-const char* const agentNodes = R"(
-[[instrumentation.node]]
-type = 40
-path = "/computer"
-properties = { "36" = "Computer Maker", "39" = "Model X - Tower", "108" = "testhost" }
-)";
-#endif
-
 namespace {
 
 using namespace providerTest;
 using testing::ElementsAre;
 
-using AbsentNodeAsset = AssetFile;
+constexpr const char* onlySystem = R"(
+[[instrumentation.node]]
+type = 1
+path = "/system"
+properties = { "36" = "Example Maker", "108" = "the system" }
+)";
 
-TEST_F(AbsentNodeAsset, DoesNotReadTheFile) {
+constexpr const char* onlyComputer = R"(
+[[instrumentation.node]]
+type = 40
+path = "/computer"
+properties = { "36" = "Computer Maker", "39" = "Model X - Tower", "108" = "testhost" }
+)";
+
+/** The parameter is whether the agent has a computer node; otherwise it has a system node. */
+class AbsentNodeAsset : public testing::WithParamInterface<bool>, public AssetFile {
+protected:
+    AbsentNodeAsset() : AssetFile(GetParam() ? onlyComputer : onlySystem) {}
+
+    const bool hasComputer = GetParam();
+};
+
+INSTANTIATE_TEST_SUITE_P(Agent, AbsentNodeAsset, testing::Bool(),
+                         [](const auto& parameter) { return parameter.param ? "WithoutSystem" : "WithoutComputer"; });
+
+TEST_P(AbsentNodeAsset, DoesNotReadTheFile) {
     write(path(), "USER.Name=Anna\n");
     const AssetIDDetails element;
     expectNothingStored(element);
@@ -38,12 +43,12 @@ TEST_F(AbsentNodeAsset, DoesNotReadTheFile) {
         ElementsAre(entering("AssetIDDetails", "AssetIDDetails.cpp"), exiting("AssetIDDetails", "AssetIDDetails.cpp")));
 }
 
-TEST_F(AbsentNodeAsset, CreatesTheFile) {
+TEST_P(AbsentNodeAsset, CreatesTheFile) {
     const AssetIDDetails element;
     EXPECT_TRUE(std::filesystem::is_regular_file(path()));
 }
 
-TEST_F(AbsentNodeAsset, StartsAtTheComputerIfThereIsOne) {
+TEST_P(AbsentNodeAsset, StartsAtTheComputerIfThereIsOne) {
     AssetIDDetails element;
     EXPECT_EQ(hasCurrent(element), hasComputer);
     std::string text = "before";
@@ -53,7 +58,7 @@ TEST_F(AbsentNodeAsset, StartsAtTheComputerIfThereIsOne) {
     EXPECT_FALSE(hasCurrent(element));
 }
 
-TEST_F(AbsentNodeAsset, ReturnsVendorAndIdentifyingNumberIfThereIsASystem) {
+TEST_P(AbsentNodeAsset, ReturnsVendorAndIdentifyingNumberIfThereIsASystem) {
     const AssetIDDetails element;
     std::string text = "before";
     EXPECT_EQ(element.getVendor(text), !hasComputer);

@@ -1,7 +1,6 @@
 // The asset element as a cursor over the computers, and the properties of each.
 
-#include "AssetIDDetails.h"
-#include "Support.h"
+#include "AssetSupport.h"
 
 #include <gmock/gmock.h>
 
@@ -17,9 +16,7 @@ using namespace providerTest;
 using testing::ElementsAre;
 using testing::IsEmpty;
 
-using KO::LeaseWarrantyProvider::AssetIDDetails;
-
-class AssetCursor : public CleanAgent {
+class AssetCursor : public AssetFile {
 protected:
     static std::string name(const AssetIDDetails& element) {
         std::string text = "(none)";

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "AssetIDDetails.h"
+#include "NodesFixture.h"
 #include "Support.h"
 
 #include <string>
@@ -70,8 +71,11 @@ inline void expectNothingStored(const AssetIDDetails& element) {
     EXPECT_EQ(pairs, (Pairs{{"before", "before"}}));
 }
 
-class AssetFile : public CleanAgent {
+/** Provides an empty data directory for an agent with these nodes. */
+class AssetFile : private ProcessNodes, public CleanAgent {
 protected:
+    explicit AssetFile(const char* nodes = assetNodes) : ProcessNodes(nodes) {}
+
     static std::filesystem::path path() { return agentEnvironment::dataDirectory() / "asset.dat"; }
     static std::string file() { return contentOf(path()); }
 };

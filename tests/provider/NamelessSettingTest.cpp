@@ -2,7 +2,11 @@
 
 #include "SettingKinds.h"
 
-const char* const agentNodes = R"(
+namespace {
+
+using namespace providerTest;
+
+constexpr const char* namelessNodes = R"(
 [[instrumentation.node]]
 type = 40
 path = "/first"
@@ -19,13 +23,15 @@ path = "/last"
 properties = { "108" = "behind" }
 )";
 
-namespace {
+template <class Kind>
+class NamelessSetting : public SettingElement<Kind> {
+protected:
+    NamelessSetting() : SettingElement<Kind>(namelessNodes) {}
+};
 
-using namespace providerTest;
+TYPED_TEST_SUITE(NamelessSetting, SettingKinds, KindNames);
 
-TYPED_TEST_SUITE(SettingElement, SettingKinds, KindNames);
-
-TYPED_TEST(SettingElement, FailsOnAnUnnamedComputerBeforeTheMatch) {
+TYPED_TEST(NamelessSetting, FailsOnAnUnnamedComputerBeforeTheMatch) {
     for (const char* name : {"behind", "unknown"}) {
         EXPECT_EQ(thrown<InstrumentationException>([&] {
                       this->toElement({{"Name", name}});
@@ -35,11 +41,11 @@ TYPED_TEST(SettingElement, FailsOnAnUnnamedComputerBeforeTheMatch) {
     EXPECT_EQ(logMessagesOf(TypeParam::elementFile, "setFilter").size(), 0U);
 }
 
-TYPED_TEST(SettingElement, IgnoresAnUnnamedComputerAfterTheMatch) {
+TYPED_TEST(NamelessSetting, IgnoresAnUnnamedComputerAfterTheMatch) {
     EXPECT_EQ(this->toElement({{"Name", "before"}}), (Keys{{"InstanceID", "/first"}}));
 }
 
-TYPED_TEST(SettingElement, RejectsThePathOfAnUnnamedComputer) {
+TYPED_TEST(NamelessSetting, RejectsThePathOfAnUnnamedComputer) {
     EXPECT_EQ(thrown<InstrumentationException>([&] {
                   this->toComputer({{"InstanceID", "/nameless"}});
               }),

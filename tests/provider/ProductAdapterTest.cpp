@@ -3,6 +3,7 @@
 #include "CMPIAssetIDDetail.h"
 #include "CMPIOstrelAgent.h"
 #include "KO/ProviderUtilities.h"
+#include "NodesFixture.h"
 #include "Support.h"
 #include "broker/Broker.h"
 #include "broker/RequestScope.h"
@@ -20,8 +21,10 @@ using KO::ProviderUtilities;
 using KO::LeaseWarrantyProvider::CMPIAssetIDDetail;
 using KO::LeaseWarrantyProvider::CMPIOstrelAgent;
 
-class ProductAdapter : public CleanAgent {
+class ProductAdapter : private ProcessNodes, public CleanAgent {
 protected:
+    ProductAdapter() : ProcessNodes(assetNodes) {}
+
     /** The values of a key, and the namespaces, of an adapter's paths. */
     struct VisitedPaths {
         std::vector<std::string> keys{};

@@ -37,8 +37,10 @@ struct WarrantySettingAdapter {
 };
 
 template <class Kind>
-class SettingAdapter : public CleanAgent {
+class SettingAdapter : private ProcessNodes, public CleanAgent {
 protected:
+    SettingAdapter() : ProcessNodes(settingNodes) {}
+
     using Adapter = typename Kind::Adapter;
     static constexpr CMPIObjectPath* (Adapter::*locateComputer)(const CMPIObjectPath*) = &Adapter::locateComputer;
     static constexpr const char* computerClass = "VELKO_ComputerSystem";

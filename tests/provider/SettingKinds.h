@@ -3,6 +3,7 @@
 #include "ElementKinds.h"
 #include "KO/Moniker.h"
 #include "LeaseSetting.h"
+#include "NodesFixture.h"
 #include "WarrantySetting.h"
 
 #include <memory>
@@ -65,8 +66,10 @@ inline Keys keysOf(Moniker moniker) {
 
 /** A setting element over empty stores, with operations on keys. */
 template <class Kind>
-class SettingElement : public RecordStore<typename Kind::Store> {
+class SettingElement : private ProcessNodes, public RecordStore<typename Kind::Store> {
 protected:
+    explicit SettingElement(const char* nodes = settingNodes) : ProcessNodes(nodes) {}
+
     Keys toElement(const Keys& computer) {
         Moniker argument = moniker(computer);
         return keysOf(Kind::elementMoniker(setting, argument));

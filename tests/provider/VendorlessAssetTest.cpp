@@ -2,7 +2,11 @@
 
 #include "AssetSupport.h"
 
-const char* const agentNodes = R"(
+namespace {
+
+using namespace providerTest;
+
+constexpr const char* vendorlessNodes = R"(
 [[instrumentation.node]]
 type = 1
 path = "/system"
@@ -14,11 +18,10 @@ path = "/system/computer"
 properties = { "36" = "Computer Maker", "39" = "Model X - Tower", "108" = "testhost" }
 )";
 
-namespace {
-
-using namespace providerTest;
-
-using VendorlessAsset = AssetFile;
+class VendorlessAsset : public AssetFile {
+protected:
+    VendorlessAsset() : AssetFile(vendorlessNodes) {}
+};
 
 TEST_F(VendorlessAsset, PassesEveryVendorFilter) {
     for (const char* vendor : {"Computer Maker", "anybody", ""}) {

@@ -11,7 +11,7 @@ namespace {
 
 namespace fs = std::filesystem;
 
-/** Never destroyed: it is needed after all static objects are gone. */
+/** Never destroyed: it is used after static objects are destroyed. */
 std::string& root() {
     static std::string& path = *new std::string;
     return path;
@@ -30,11 +30,11 @@ void writeConfiguration(const fs::path& file) {
            << agentNodes;
 }
 
-/** Comes before all other static initialisation: the record tables are loaded in it. */
+/** Runs before static objects are initialized, which loads the record tables. */
 __attribute__((constructor(101))) void setUp() {
     std::string pattern = (fs::temp_directory_path() / "agent-XXXXXX").string();
     if (mkdtemp(pattern.data()) == nullptr) {
-        throw std::runtime_error("cannot make a directory for the test's agent");
+        throw std::runtime_error("cannot create a directory for the agent");
     }
     root() = pattern;
     fs::create_directory(dataDirectory());

@@ -5,19 +5,17 @@
 #include <vector>
 
 /**
- * The agent's surroundings of a test program: a directory of its own with configuration, data
- * directory and log file, set up before the first static object of the program needs them, and
- * removed at the program's end.
+ * The agent of a test program: a temporary directory with configuration, data directory and log file. It is created
+ * before static objects are initialized, and removed when the program ends. The log contains records of all levels.
  *
- * A program that links this says of which instrumentation nodes its agent knows, as TOML text, by
- * defining `const char* const agentNodes` (constant-initialised). Levels admit all records.
+ * The program defines `const char* const agentNodes`, the agent's nodes as a TOML fragment (constant-initialized).
  */
 extern const char* const agentNodes;
 
-/** A program that defines it likewise has no log: what a log would say is not what it is about, or far too much. */
+/** A program that defines it has no log. */
 extern const bool agentHasNoLog __attribute__((weak));
 
-/** The version of the agent product, for programs that define it likewise; "4.2.0" in all others. */
+/** The version of the agent's product, if the program defines it; otherwise "4.2.0". */
 extern const char* const agentVersion __attribute__((weak));
 
 namespace agentEnvironment {
@@ -35,12 +33,12 @@ path = "/system/computer"
 properties = { "36" = "Example Maker", "39" = "Model X - Tower", "108" = "testhost" }
 )";
 
-std::filesystem::path directory();      ///< all below is in here
+std::filesystem::path directory();      ///< contains all of the following
 std::filesystem::path dataDirectory();  ///< with Lease.dat, Warranty.dat, asset.dat
 std::filesystem::path installDirectory();
 std::filesystem::path logFile();
 
-/** Empties the data directory and the log, for a test's clean start. Tables in memory stay. */
+/** Empties the data directory and the log, not the tables in memory. */
 void clear();
 
 /** One record of the log. */
@@ -54,10 +52,10 @@ struct LogRecord {
     std::string text;
 };
 
-/** The records written since clear() or forgetLog(). */
+/** The records since clear() or forgetLog(). */
 std::vector<LogRecord> log();
 
-/** Drops the records written so far. */
+/** Removes the current records. */
 void forgetLog();
 
 }  // namespace agentEnvironment

@@ -1,7 +1,7 @@
 #include "support/AssetModel.h"
 
+#include "cim/DateTime.h"
 #include "schema/MofWriter.h"
-#include "schema/Text.h"
 #include "support/Values.h"
 
 namespace testsupport {
@@ -31,7 +31,7 @@ const std::array<AssetField, 21> assetFields{{
 }};
 
 std::string AssetField::kept(const std::string& given) const {
-    const bool isPointInTime = cimhost::isDateTime(given) && given[21] != ':' && given.find('*') == std::string::npos;
+    const bool isPointInTime = cim::isPointInTime(given);
     return kind != AssetKind::date || isPointInTime ? given : std::string();
 }
 

@@ -6,38 +6,38 @@
 
 #include "model/Value.h"
 
-// The rules of the asset file, written down a second time and independently of the provider.
+// A model of the asset file, independent of the provider.
 
 namespace testsupport {
 
-/** How a value of the asset file comes about. */
+/** The kinds of values in the asset file. */
 enum class AssetKind {
-    readOnly,      ///< only read: other programs write it
-    text,          ///< any text
-    date,          ///< a point in time; what is none is kept as an empty text
-    personalized,  ///< any text; one that is not given repeats the one before it of the same name
+    readOnly,      ///< written by other programs
+    text,          ///< any string
+    date,          ///< a point in time; other strings are stored as an empty one
+    personalized,  ///< any string; one that is not sent repeats the preceding one of the same name
 };
 
-/** A value that the asset file holds. */
+/** A value of the asset file. */
 struct AssetField {
     const char* key;       ///< of the file
-    const char* property;  ///< the CIM property that shows it
+    const char* property;  ///< the CIM property with the value
     AssetKind kind;
 
-    /** Whether it is the first of those that repeat one another. */
+    /** Whether it is the first of the values that repeat each other. */
     bool isFirst() const { return std::string(property).back() == '1'; }
 
-    /** What is kept of a value that a client gives. */
+    /** The stored value of one that a client sends. */
     std::string kept(const std::string& given) const;
 };
 
-/** What an instance shows of a value that the file holds, "" without one: "Name=value" as MOF. */
+/** The property of a stored value as "Name=value" in MOF. @param kept the stored value; empty: none */
 std::string shownValue(const AssetField& field, const std::string& kept);
 
-/** The same of a real instance, in the order of assetFields. */
+/** The properties of an instance in the same form, in the order of assetFields. */
 std::vector<std::string> shownAsset(const cimhost::Instance& instance);
 
-/** All that the asset file holds; those that repeat one another in their order. */
+/** All values of the asset file. */
 extern const std::array<AssetField, 21> assetFields;
 
 }  // namespace testsupport

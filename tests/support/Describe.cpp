@@ -8,17 +8,17 @@
 namespace testsupport {
 namespace {
 
-/** The text of an object's content; "null" for null, "invalid" for a handle that is none. */
-template <class Handle, class Text>
-std::string contentText(const Handle* handle, Text text) {
+/** Describes the content of an object; "null", or "invalid" if the handle has no object. */
+template <class Handle, class Describe>
+std::string describeContent(const Handle* handle, Describe describe) {
     if (handle == nullptr) {
         return "null";
     }
     const auto* object = cimhost::objectOf(handle);
-    return object == nullptr ? "invalid" : text(*object->content);
+    return object == nullptr ? "invalid" : describe(*object->content);
 }
 
-std::string valueText(const CMPIValue* value, CMPIType type) {
+std::string describeValue(const CMPIValue* value, CMPIType type) {
     try {
         return cimhost::formatMof(cimhost::valueFrom(value, type));
     } catch (const cimhost::Failure&) {
@@ -45,15 +45,16 @@ void Description::add(const char** names) {
 }
 
 void Description::add(const CMPIObjectPath* path) {
-    texts.push_back(contentText(path, cimhost::formatObjectPath));
+    texts.push_back(describeContent(path, cimhost::formatObjectPath));
 }
 
 void Description::add(const CMPIInstance* instance) {
-    texts.push_back(contentText(instance, [](const auto& content) { return formatObjectPath(content.value.path); }));
+    texts.push_back(
+        describeContent(instance, [](const auto& content) { return formatObjectPath(content.value.path); }));
 }
 
 void Description::add(const CMPIString* string) {
-    texts.push_back(contentText(string, [](const std::string& text) { return text; }));
+    texts.push_back(describeContent(string, [](const std::string& text) { return text; }));
 }
 
 void Description::add(const CMPIValue* value) {
@@ -63,7 +64,7 @@ void Description::add(const CMPIValue* value) {
 
 void Description::add(CMPIType type) {
     if (pending.position) {
-        texts[*pending.position] = valueText(pending.value, type);
+        texts[*pending.position] = describeValue(pending.value, type);
         pending = {};
     }
     texts.push_back(std::to_string(type));

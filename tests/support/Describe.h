@@ -7,11 +7,11 @@
 #include <type_traits>
 #include <vector>
 
-// Arguments of CMPI calls as text.
+// Describes the arguments of CMPI calls.
 
 namespace testsupport {
 
-/** Whether the type is a handle that points to a function table. */
+/** Whether the type is a handle with a function table. */
 template <class Type>
 constexpr bool isHandle =
     std::is_same_v<Type, CMPIBroker> || std::is_same_v<Type, CMPIString> || std::is_same_v<Type, CMPIObjectPath> ||
@@ -22,13 +22,13 @@ constexpr bool isHandle =
 template <class Type>
 constexpr bool hasTable = std::is_pointer_v<Type>&& isHandle<std::remove_const_t<std::remove_pointer_t<Type>>>;
 
-/** What is known of a call's value argument while its arguments are gone through. */
+/** The value argument of a call whose type argument is not read yet. */
 struct ValueArgument {
     const CMPIValue* value = nullptr;
-    std::optional<std::size_t> position{};  ///< of its text among the texts
+    std::optional<std::size_t> position{};  ///< of its description
 };
 
-/** The texts of a call's arguments; those that say nothing add none. */
+/** The descriptions of a call's arguments. Some types have none. */
 class Description {
 public:
     void add(const char* text);
@@ -37,13 +37,13 @@ public:
     void add(const CMPIInstance* instance);
     void add(const CMPIString* string);
     void add(const CMPIValue* value);
-    void add(CMPIType type);  ///< with a value before it, this makes the value readable
+    void add(CMPIType type);  ///< also describes a preceding value
     void add(CMPIBoolean flag) { texts.push_back(std::to_string(flag)); }
     void add(int number) { texts.push_back(std::to_string(number)); }
     void add(CMPICount number) { texts.push_back(std::to_string(number)); }
     void add(CMPIUint64 number) { texts.push_back(std::to_string(number)); }
 
-    /** Anything else: pointers for output, brokers, contexts... */
+    /** Other types: pointers for output, brokers, contexts and so on have no description. */
     template <class Other>
     void add(const Other& argument) {
         using Plain = std::remove_const_t<std::remove_pointer_t<Other>>;
@@ -61,7 +61,7 @@ private:
     ValueArgument pending;
 };
 
-/** The texts of all arguments but the first when that is the object of the call. */
+/** Describes all arguments, without the object of the call. */
 template <class First, class... Others>
 std::vector<std::string> describeAll(const First& first, const Others&... others) {
     Description description;

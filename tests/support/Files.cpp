@@ -14,14 +14,14 @@ TempDirectory::TempDirectory() : TempDirectory(std::filesystem::path(testing::Te
 TempDirectory::TempDirectory(const std::filesystem::path& parent) {
     std::string pattern = (parent / "law-XXXXXX").string();
     if (mkdtemp(pattern.data()) == nullptr) {
-        throw std::runtime_error("cannot make a folder like " + pattern);
+        throw std::runtime_error("cannot create a directory like " + pattern);
     }
-    folder = pattern;
+    directory = pattern;
 }
 
 TempDirectory::~TempDirectory() {
     std::error_code ignored;
-    std::filesystem::remove_all(folder, ignored);
+    std::filesystem::remove_all(directory, ignored);
 }
 
 std::string readFile(const std::filesystem::path& file) {

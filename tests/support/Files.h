@@ -6,7 +6,7 @@
 
 namespace testsupport {
 
-/** A new, empty folder of this test's own, removed with all it contains at the end. */
+/** A new temporary directory, which the destructor removes. */
 class TempDirectory {
 public:
     /** In testing::TempDir(). */
@@ -16,19 +16,19 @@ public:
     TempDirectory(const TempDirectory&) = delete;
     TempDirectory& operator=(const TempDirectory&) = delete;
 
-    const std::filesystem::path& path() const { return folder; }
+    const std::filesystem::path& path() const { return directory; }
 
-    /** The folder as text that ends in a slash, as the agent's folders do. */
-    std::string withSlash() const { return folder.string() + "/"; }
+    /** The path with a slash at the end, like the agent's directories. */
+    std::string withSlash() const { return directory.string() + "/"; }
 
 private:
-    std::filesystem::path folder;
+    std::filesystem::path directory;
 };
 
-/** The whole file, byte by byte. std::runtime_error when it cannot be read. */
+/** Returns the content of a file. @throws std::runtime_error if it cannot be read */
 std::string readFile(const std::filesystem::path& file);
 
-/** Replaces the content of the file. Throws std::runtime_error if it cannot be written. */
+/** Replaces the content of a file. @throws std::runtime_error if it cannot be written */
 void writeFile(const std::filesystem::path& file, std::string_view content);
 
 }  // namespace testsupport

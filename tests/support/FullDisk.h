@@ -6,7 +6,7 @@
 
 namespace testsupport {
 
-/** No file of this process can grow beyond a size while this lives, as if the disk were full. */
+/** Limits the size of this process's files while it exists, as if the disk were full. */
 class FullDisk {
 public:
     explicit FullDisk(rlim_t size) : handler(std::signal(SIGXFSZ, SIG_IGN)) {

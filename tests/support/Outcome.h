@@ -10,14 +10,14 @@
 
 namespace testsupport {
 
-/** Everything that a provider did in answer to one call. */
+/** The response of a provider to one call. */
 struct Outcome {
     int rc = CMPI_RC_OK;
-    bool hasMessage = false;         ///< whether the status' message pointer was not null
-    std::string message{};           ///< its text
-    bool threw = false;              ///< an exception left the provider; rc is then CMPI_RC_ERR_FAILED
-    cimhost::ResultEvents events{};  ///< what it returned, in order
-    int doneCount = 0;               ///< how often it called returnDone
+    bool hasMessage = false;         ///< whether the status had a message
+    std::string message{};           ///< its characters
+    bool threw = false;              ///< whether the provider threw an exception; rc is then CMPI_RC_ERR_FAILED
+    cimhost::ResultEvents events{};  ///< its results, in order
+    int doneCount = 0;               ///< number of calls of returnDone
 
     std::vector<cimhost::Instance> instances() const { return cimhost::eventsOf<cimhost::Instance>(events); }
     std::vector<cimhost::ObjectPath> paths() const { return cimhost::eventsOf<cimhost::ObjectPath>(events); }

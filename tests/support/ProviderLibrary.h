@@ -15,43 +15,42 @@
 namespace testsupport {
 
 /**
- * A provider library in this process, called as an object manager calls it.
+ * A provider library in this process, called as by an object manager.
  *
- * Loading it calls nothing. The factories are called, with the broker's handle, when an interface is first needed, or
- * by create...MI(), which tells all of it and may be called again. Every operation is a request of its own, with the
- * context entries below; what the provider makes in it is freed at its end. The library is closed in the end;
- * cleanup is called only by the test. Neither the library nor the broker may go while a call is running.
+ * Constructing it only loads the library. The first use of an interface calls its factory, with the broker's handle;
+ * create...MI() calls it again. Each operation is a separate request with the context entries below, at the end of
+ * which the provider's objects are freed. The destructor closes the library without cleanup. The library and the broker
+ * must outlive all calls.
  */
 class ProviderLibrary {
 public:
     /**
-     * @param file of the library
-     * @param itsName of the provider: the prefix of its factories
-     * @throws cimhost::LibraryError when it cannot be loaded
+     * @param itsName prefix of the provider's factories
+     * @throws cimhost::LibraryError if the library cannot be loaded
      */
     ProviderLibrary(const std::string& file, std::string itsName, RecordingBroker& itsBroker,
                     int flags = RTLD_NOW | RTLD_LOCAL);
 
-    /** A function of the library by name; null when it has none. */
+    /** A function of the library by name; null if it has none. */
     template <class Function>
     Function* function(const std::string& functionName) const {
         return library->function<Function>(functionName);
     }
 
     /** @name Factories
-     * Call the factory with a broker, null context and this status, which a factory may leave as it is. The answer
-     * takes the place of the interface so far. @throws cimhost::LibraryError when the library has no such factory
+     * Call the factory with a broker, a null context and this status. The result replaces the current interface.
+     * @throws cimhost::LibraryError if the library has no such factory
      */
     ///@{
     CMPIInstanceMI* createInstanceMI(const CMPIBroker* handle, CMPIStatus* rc);
     CMPIAssociationMI* createAssociationMI(const CMPIBroker* handle, CMPIStatus* rc);
     ///@}
 
-    /** The interfaces; each factory is called once, at the first need. */
+    /** The interfaces. The first call calls the factory. */
     CMPIInstanceMI* instanceMI();
     CMPIAssociationMI* associationMI();
 
-    /** The context of the calls to come. From the start: CMPIInvocationFlags 0, CMPIPrincipal "tester". */
+    /** Sets the context of the following calls. The default is CMPIInvocationFlags 0 and CMPIPrincipal "tester". */
     void setContext(cimhost::ContextEntries entries) { context = std::move(entries); }
 
     /** @name Operations */
@@ -96,9 +95,9 @@ public:
     ///@}
 
     /**
-     * Any other call, such as one with null arguments, as a request of its own.
-     * @param body called with a cimhost::RequestScope& (which makes objects from plain values), const CMPIContext*
-     *             and const CMPIResult*; answers the provider's CMPIStatus
+     * Makes any other call, such as one with null arguments, as a separate request.
+     * @param body called with a cimhost::RequestScope& (which creates objects from plain values), const CMPIContext*
+     *             and const CMPIResult*; returns the provider's CMPIStatus
      */
     template <class Body>
     Outcome call(Body&& body) {

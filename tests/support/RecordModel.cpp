@@ -4,8 +4,8 @@
 #include <cstdint>
 #include <limits>
 
+#include "cim/DateTime.h"
 #include "schema/MofWriter.h"
-#include "schema/Text.h"
 #include "support/Values.h"
 
 namespace testsupport {
@@ -39,12 +39,12 @@ std::string valueOf(Form form, std::string word) {
     return word;
 }
 
-/** Takes words and numbers off a text; once it has failed it gives nothing more. */
+/** Reads words and numbers of a file. After a failure it reads nothing more. */
 class Scanner {
 public:
     explicit Scanner(std::string_view content) : text(content) {}
 
-    /** Reads over the value what stands there next, if it is of that form. */
+    /** Reads the next value, if it has this form. */
     void take(Form form, std::string& value) {
         if (form == Form::number || form == Form::flag) {
             takeNumber(form, value);
@@ -83,7 +83,7 @@ private:
         }
     }
 
-    /** Whether anything is left. */
+    /** Skips white space. @return whether there is more to read */
     bool skipToNext() {
         position = hasFailed ? std::string::npos : text.find_first_not_of(whiteSpace, position);
         hasFailed = position == std::string::npos;
@@ -95,12 +95,12 @@ private:
     bool hasFailed = false;
 };
 
-/** Whether a datetime property can have the text: a date or an interval without asterisks. */
+/** Whether a datetime property can have the value: a date or an interval without asterisks. */
 bool isShownDate(const std::string& text) {
-    return cimhost::isDateTime(text) && text.find('*') == std::string::npos;
+    return cim::isPointInTime(text) || cim::isInterval(text);
 }
 
-/** What the property shows for a value, as MOF. An object manager gets no character after a null. */
+/** The value of the property in MOF. Strings end at the first null character. */
 std::string shownValue(Form form, const std::string& value) {
     switch (form) {
         case Form::number:

@@ -7,16 +7,16 @@
 
 #include "model/Value.h"
 
-// The rules of the record files, written down a second time and independently of the provider.
+// A model of the record files, independent of the provider.
 
 namespace testsupport {
 
-/** How a field stands in a record file. */
+/** The forms of fields in a record file. */
 enum class Form { identifier, text, date, number, flag };
 
-/** A field of a record, in file order. */
+/** A field of a record. */
 struct ModelField {
-    const char* property;  ///< the CIM property that shows it
+    const char* property;  ///< the CIM property with its value
     Form form;
 };
 
@@ -25,39 +25,39 @@ using ModelFields = std::vector<ModelField>;
 const ModelFields& leaseFields();
 const ModelFields& warrantyFields();
 
-/** A record's values in file order as text: numbers in decimal digits, flags "1" or "0". */
+/** The values of a record in file order, as strings: numbers in decimal digits, flags "1" or "0". */
 using ModelRecord = std::vector<std::string>;
 
-/** The records in use of one class, as a model of the provider's table and file. */
+/** A model of the provider's table and file of one class. */
 class RecordModel {
 public:
     explicit RecordModel(const ModelFields& itsFields) : fields(itsFields) {}
 
-    /** A record as creation makes it. */
+    /** A new record. */
     ModelRecord newRecord(const std::string& instanceId) const;
 
-    /** The first record with an identifier; null for none. */
+    /** The first record with an identifier; null if there is none. */
     ModelRecord* find(const std::string& instanceId);
 
-    /** Forgets the first record with an identifier; whether there was one. */
+    /** Removes the first record with an identifier. @return whether there was one */
     bool remove(const std::string& instanceId);
 
-    /** The file's content for the records. */
+    /** The content of the file. */
     std::string written() const;
 
-    /** The number of records that a file's content announces. */
+    /** The number of records at the beginning of a file's content. */
     static std::size_t announcedIn(std::string_view content);
 
-    /** Replaces the records by what a file's content is read as. */
+    /** Replaces the records by those of a file's content. */
     void read(std::string_view content);
 
-    /** What an instance of a record shows: "Name=value" as MOF, in the order of the file's fields. */
+    /** The properties of a record as "Name=value" in MOF, in file order. */
     std::vector<std::string> shown(const ModelRecord& record) const;
 
-    /** The same of all records. */
+    /** The properties of all records. */
     std::vector<std::vector<std::string>> shownRecords() const;
 
-    /** The same of a real instance. */
+    /** The properties of an instance in the same form. */
     std::vector<std::string> shownFields(const cimhost::Instance& instance) const;
 
     ModelFields fields;

@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <stdexcept>
 
-#include "schema/Names.h"
+#include "cim/Names.h"
 
 namespace testsupport {
 
@@ -18,56 +18,58 @@ void Recording::silence(const CMPIString* string) {
     silent.insert(string);
 }
 
-std::optional<Verdict> Recording::note(RecordedCall call, const void* object) {
+std::optional<InjectedResult> Recording::note(RecordedCall call, const void* object) {
     const std::lock_guard<std::mutex> lock(mutex);
     const int number = ++counts[call.function];
-    const std::string name = call.arguments.empty() ? std::string{} : cimhost::foldedName(call.arguments.front());
-    const auto byName = dataOrders.find({call.function, name});
-    const std::vector<Order>& ofFunction = orders[call.function];
+    const std::string name = call.arguments.empty() ? std::string{} : cim::foldedName(call.arguments.front());
+    const auto byName = dataByName.find({call.function, name});
+    const std::vector<Failure>& ofFunction = failures[call.function];
     const bool isSilent = call.function == "CMPIStringFT.getCharPtr" && silent.count(object) != 0;
     made.push_back(std::move(call));
     if (isSilent) {
-        return Verdict{};
+        return InjectedResult{};
     }
     const auto due = std::find_if(ofFunction.rbegin(), ofFunction.rend(),
-                                  [&](const Order& order) { return !order.dueAt || *order.dueAt == number; });
+                                  [&](const Failure& failure) { return !failure.number || *failure.number == number; });
     if (due != ofFunction.rend()) {
-        return due->verdict;
+        return due->result;
     }
-    return byName == dataOrders.end() ? std::nullopt : std::optional<Verdict>(byName->second);
+    return byName == dataByName.end() ? std::nullopt : std::optional<InjectedResult>(byName->second);
 }
 
-void Recording::order(const std::string& function, std::optional<int> number, Verdict verdict) {
+void Recording::fail(const std::string& function, std::optional<int> number, InjectedResult result) {
     requireFunction(function);
     const std::lock_guard<std::mutex> lock(mutex);
-    const std::optional<int> dueAt = number ? std::optional<int>(counts[function] + *number) : std::nullopt;
-    orders[function].push_back({dueAt, verdict});
+    if (number) {
+        *number += counts[function];
+    }
+    failures[function].push_back({number, result});
 }
 
-void Recording::orderData(const std::string& function, const std::string& name, Verdict verdict) {
+void Recording::returnData(const std::string& function, const std::string& name, InjectedResult result) {
     requireFunction(function);
     const std::lock_guard<std::mutex> lock(mutex);
-    dataOrders[{function, cimhost::foldedName(name)}] = verdict;
+    dataByName[{function, cim::foldedName(name)}] = result;
 }
 
-void Recording::orderState(const std::string& function, CMPIValueState state) {
+void Recording::returnState(const std::string& function, CMPIValueState state) {
     requireFunction(function);
     const std::lock_guard<std::mutex> lock(mutex);
     states[function] = state;
 }
 
-CMPIData Recording::withOrderedState(const std::string& function, CMPIData data) const {
+CMPIData Recording::withInjectedState(const std::string& function, CMPIData data) const {
     const std::lock_guard<std::mutex> lock(mutex);
     const auto ordered = states.find(function);
     data.state = ordered == states.end() ? data.state : ordered->second;
     return data;
 }
 
-void Recording::obey() {
+void Recording::cancelFailures() {
     const std::lock_guard<std::mutex> lock(mutex);
     states.clear();
-    orders.clear();
-    dataOrders.clear();
+    failures.clear();
+    dataByName.clear();
 }
 
 std::vector<RecordedCall> Recording::calls() const {

@@ -16,14 +16,14 @@
 #include "support/Describe.h"
 #include "support/RecordingBroker.h"
 
-// How RecordingBroker stands between a provider and the broker's functions.
+// The implementation of RecordingBroker: functions that record a call and then call the broker's function.
 
 namespace testsupport {
 
-/** How deep this thread is inside the broker: what a test lets fail for a provider must not fail for its broker. */
+/** Number of nested broker calls of this thread. Failures that a test injects apply only outside of them. */
 inline thread_local int insideBroker = 0;
 
-/** A thread is inside the broker while this lives. */
+/** Marks this thread as inside a broker call, for its lifetime. */
 class BrokerScope {
 public:
     BrokerScope() { ++insideBroker; }
@@ -32,46 +32,46 @@ public:
     BrokerScope& operator=(const BrokerScope&) = delete;
 };
 
-/** What happens to a call instead of the real function. */
-struct Verdict {
+/** The result of a call instead of that of the real function. */
+struct InjectedResult {
     CMPIrc rc = CMPI_RC_OK;
-    std::optional<CMPIData> data{};  ///< what a function that answers data answers; nothing otherwise
+    std::optional<CMPIData> data{};  ///< of a function that returns data
 };
 
-/** The calls and orders of one RecordingBroker. */
+/** The calls and failures of one RecordingBroker. */
 class Recording {
 public:
-    /** Writes a call down and says what happens to it; none for the real function. */
-    std::optional<Verdict> note(RecordedCall call, const void* object = nullptr);
+    /** Records a call. @return the injected result; none: call the real function */
+    std::optional<InjectedResult> note(RecordedCall call, const void* object = nullptr);
 
-    /** Lets this string have no characters. */
+    /** Removes the characters of a string. */
     void silence(const CMPIString* string);
 
-    /** An order for a call of a function: by its number from now, or for every one when the number is none. */
-    void order(const std::string& function, std::optional<int> number, Verdict verdict);
-    void orderData(const std::string& function, const std::string& name, Verdict verdict);
-    void orderState(const std::string& function, CMPIValueState state);
+    /** Fails a call of a function. @param number from the next call; none: all following calls */
+    void fail(const std::string& function, std::optional<int> number, InjectedResult result);
+    void returnData(const std::string& function, const std::string& name, InjectedResult result);
+    void returnState(const std::string& function, CMPIValueState state);
 
-    /** The data as the function returns them: with another state if one is ordered for it. */
-    CMPIData withOrderedState(const std::string& function, CMPIData data) const;
-    void obey();
+    /** The data with the state of returnState(), if there is one for the function. */
+    CMPIData withInjectedState(const std::string& function, CMPIData data) const;
+    void cancelFailures();
 
     std::vector<RecordedCall> calls() const;
     void forget();
 
 private:
-    struct Order {
-        std::optional<int> dueAt{};  ///< number of the call since the beginning
-        Verdict verdict{};
+    struct Failure {
+        std::optional<int> number{};  ///< number of the call since the beginning
+        InjectedResult result{};
     };
 
     mutable std::mutex mutex;
     std::vector<RecordedCall> made;
     std::map<std::string, int> counts;  ///< calls of each function since the beginning
-    std::map<std::string, std::vector<Order>> orders;
-    std::map<std::pair<std::string, std::string>, Verdict> dataOrders;  ///< by function and name in lower case
-    std::map<std::string, CMPIValueState> states;                       ///< ordered, by function
-    std::set<const void*> silent;                                       ///< strings without characters
+    std::map<std::string, std::vector<Failure>> failures;
+    std::map<std::pair<std::string, std::string>, InjectedResult> dataByName;  ///< by function and name in lower case
+    std::map<std::string, CMPIValueState> states;                              ///< by function
+    std::set<const void*> silent;                                              ///< strings without characters
 };
 
 /** The recording that a call on this object or broker belongs to; the youngest if it is null. */
@@ -124,13 +124,13 @@ inline const void* tableOfCall() {
 }
 
 /** As brokers do, a call that fails tells why in words. */
-inline CMPIStatus orderedStatus(CMPIrc rc) {
+inline CMPIStatus injectedStatus(CMPIrc rc) {
     return cimhost::toCmpi({rc, rc == CMPI_RC_OK ? std::string{} : "ordered by the test"});
 }
 
 inline void setStatus(CMPIStatus* status, CMPIrc rc) {
     if (status != nullptr) {
-        *status = orderedStatus(rc);
+        *status = injectedStatus(rc);
     }
 }
 
@@ -139,13 +139,13 @@ void setStatus(const Other&, CMPIrc) {}
 
 /** The answer of a function that does nothing. */
 template <class Result>
-Result emptyAnswer(const Verdict& verdict) {
+Result emptyAnswer(const InjectedResult& result) {
     if constexpr (std::is_same_v<Result, CMPIStatus>) {
-        return orderedStatus(verdict.rc);
+        return injectedStatus(result.rc);
     } else if constexpr (std::is_same_v<Result, CMPIData>) {
         CMPIData data{};
-        data.state = verdict.rc == CMPI_RC_OK ? CMPI_nullValue : CMPI_badValue;
-        return verdict.data.value_or(data);
+        data.state = result.rc == CMPI_RC_OK ? CMPI_nullValue : CMPI_badValue;
+        return result.data.value_or(data);
     } else if constexpr (!std::is_void_v<Result>) {
         return Result{};
     }
@@ -166,14 +166,14 @@ struct Recorded<slot> {
         if (recording == nullptr) {
             return original(arguments...);
         }
-        const std::optional<Verdict> verdict =
+        const std::optional<InjectedResult> result =
             recording->note({name, describeAll(arguments...)}, objectOfCall(arguments...));
-        if (verdict) {
-            (setStatus(arguments, verdict->rc), ...);
-            return emptyAnswer<Result>(*verdict);
+        if (result) {
+            (setStatus(arguments, result->rc), ...);
+            return emptyAnswer<Result>(*result);
         }
         if constexpr (std::is_same_v<Result, CMPIData>) {
-            return recording->withOrderedState(name, original(arguments...));
+            return recording->withInjectedState(name, original(arguments...));
         } else {
             return original(arguments...);
         }

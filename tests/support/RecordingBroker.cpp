@@ -5,13 +5,13 @@
 #include <utility>
 
 #include "broker/Arena.h"
-#include "schema/Names.h"
+#include "cim/Names.h"
 #include "support/Recording.h"
 
 namespace testsupport {
 namespace {
 
-/** What the broker answers to enumerations. */
+/** The responses to enumerations. */
 class ServedInstances : public cimhost::UpCalls {
 public:
     void serve(const std::string& className, std::vector<cimhost::Instance> instances) {
@@ -19,15 +19,15 @@ public:
         for (const cimhost::Instance& instance : response.instances) {
             response.paths.push_back(instance.path);
         }
-        served[cimhost::foldedName(className)] = std::move(response);
+        served[cim::foldedName(className)] = std::move(response);
     }
 
     void fail(const std::string& className, CMPIrc rc) {
-        served[cimhost::foldedName(className)] = cimhost::Response::failed({rc, "ordered to fail"});
+        served[cim::foldedName(className)] = cimhost::Response::failed({rc, "requested failure"});
     }
 
     cimhost::Response perform(cimhost::Request request) override {
-        const auto found = served.find(cimhost::foldedName(request.path.className));
+        const auto found = served.find(cim::foldedName(request.path.className));
         if (request.operation > cimhost::Operation::enumerateInstanceNames) {
             return cimhost::notSupported(request.operation);
         }
@@ -43,7 +43,7 @@ private:
 
 }  // namespace
 
-/** What a RecordingBroker is made of. */
+/** The members of a RecordingBroker. */
 struct RecordingBroker::State {
     State()
         : tables(recordingTables()),
@@ -52,7 +52,7 @@ struct RecordingBroker::State {
           handle(*broker.handle()),
           objects(tables) {}
 
-    /** Whether a handle's table pointer leads here. */
+    /** Whether a function table is one of this broker. */
     bool owns(const void* table) const {
         const void* all[] = {&tables.broker,   &tables.string, &tables.objectPath,  &tables.instance,
                              &tables.dateTime, &tables.array,  &tables.enumeration, &tables.args,
@@ -65,13 +65,13 @@ struct RecordingBroker::State {
     cimhost::ClassInfoLookup classes;
     cimhost::Broker broker;
     CMPIBroker handle;
-    cimhost::Arena objects;  ///< made for the test
+    cimhost::Arena objects;  ///< created for the test
     Recording recording;
 };
 
 namespace {
 
-/** The brokers alive, the youngest last. */
+/** The existing brokers, the newest last. */
 struct Alive {
     std::mutex mutex;
     std::vector<RecordingBroker::State*> states;
@@ -144,11 +144,11 @@ void RecordingBroker::forget() {
 }
 
 void RecordingBroker::failCall(const std::string& function, int number, CMPIrc rc) {
-    state->recording.order(function, number, {rc, {}});
+    state->recording.fail(function, number, {rc, {}});
 }
 
 void RecordingBroker::failEvery(const std::string& function, CMPIrc rc) {
-    state->recording.order(function, std::nullopt, {rc, {}});
+    state->recording.fail(function, std::nullopt, {rc, {}});
 }
 
 void RecordingBroker::answerNothing(const std::string& function, int number) {
@@ -161,15 +161,15 @@ void RecordingBroker::answerNothingEver(const std::string& function) {
 
 void RecordingBroker::answerData(const std::string& function, const std::string& name, const CMPIData& data,
                                  CMPIrc rc) {
-    state->recording.orderData(function, name, {rc, data});
+    state->recording.returnData(function, name, {rc, data});
 }
 
 void RecordingBroker::answerState(const std::string& function, CMPIValueState valueState) {
-    state->recording.orderState(function, valueState);
+    state->recording.returnState(function, valueState);
 }
 
-void RecordingBroker::obey() {
-    state->recording.obey();
+void RecordingBroker::cancelFailures() {
+    state->recording.cancelFailures();
 }
 
 CMPIString* RecordingBroker::string(const std::string& text) {

@@ -15,28 +15,25 @@ namespace testsupport {
 /** A call that a provider made through one of the broker's function tables. */
 struct RecordedCall {
     std::string function;                ///< table and function, "CMPIResultFT.returnInstance"
-    std::vector<std::string> arguments;  ///< those that say something: see RecordingBroker
+    std::vector<std::string> arguments;  ///< descriptions; see RecordingBroker
 };
 
 using cimhost::lab::Manager;
 
 /**
- * A CMPI broker for contract tests of a provider: a real one (cimhost::Broker) that writes down every call and can
- * be told to fail.
+ * A cimhost::Broker that records the calls of a provider, and lets calls fail. Thread-safe. It must outlive the
+ * provider.
  *
- * Functions are named by table and function as the standard spells them: "CMPIBrokerEncFT.newInstance",
- * "CMPIObjectPathFT.getKey", "CMPIStringFT.getCharPtr". std::invalid_argument for a name that is none, so that a
- * test cannot wait for what never comes.
+ * Functions are named by table and function, as in the CMPI standard: "CMPIBrokerEncFT.newInstance",
+ * "CMPIObjectPathFT.getKey", "CMPIStringFT.getCharPtr". Other names are a std::invalid_argument.
  *
- * Recorded are the calls of the provider only: what the test or the host does with plain values is not a call.
- * Arguments are written as text, in order: names and other texts as they are ("null" for a null pointer), object
- * paths as "root/cimv2:Class.Key="x"", instances as the path of theirs, strings as their characters, property lists
- * as "{A,B}", values as MOF ("\"text\"", "12", "NULL"), types and counts as numbers. Left out are the broker,
- * contexts, results, the object itself that the function is called on, and pointers for output.
+ * Calls of the test and the host are not recorded. Arguments are described in order: character pointers by their
+ * characters ("null" for a null pointer), object paths as "root/cimv2:Class.Key="x"", instances by their path, strings
+ * by their characters, property lists as "{A,B}", values in MOF ("\"x\"", "12", "NULL"), types and counts as numbers.
+ * The broker, contexts, results, the object of the call, and pointers for output are omitted.
  *
- * Several may be alive at a time: each has its own tables, and objects stay with the broker that made them.
- * Calls on a null object, and those of CMPIBrokerExtFT, which name no broker, go to the youngest.
- * Safe to use from several threads. It must outlive the provider that has its handle.
+ * Several brokers can exist: each has separate tables, and objects belong to the broker that created them. Calls on
+ * null objects and of CMPIBrokerExtFT, which have no broker, belong to the newest.
  */
 class RecordingBroker {
 public:
@@ -45,13 +42,13 @@ public:
     RecordingBroker(const RecordingBroker&) = delete;
     RecordingBroker& operator=(const RecordingBroker&) = delete;
 
-    /** The broker to hand to a provider's factory. emulate() changes it, so call that first. */
+    /** The handle for a provider's factory. Call emulate() first, which changes it. */
     const CMPIBroker* handle() const;
 
-    /** The host's broker underneath, for RequestScope and runCall(). */
+    /** The host's broker, for RequestScope and runCall(). */
     cimhost::Broker& broker();
 
-    /** @name What the provider called */
+    /** @name Recorded calls */
     ///@{
     std::vector<RecordedCall> calls() const;
 
@@ -62,34 +59,33 @@ public:
     std::vector<std::string> functions() const;
     int count(const std::string& function) const;
 
-    /** Forgets the calls; orders to fail stay. */
+    /** Removes the recorded calls. Failures remain. */
     void forget();
     ///@}
 
-    /** @name Orders to fail
-     * A failing function does nothing but set its status and answer null, 0, or data with the state CMPI_badValue.
-     * Its call is recorded. Orders for one function add up; the latest wins for a call that several apply to.
+    /** @name Failures
+     * A failing function only sets its status and returns null, 0, or data with the state CMPI_badValue. Its call is
+     * recorded. If several failures apply to a call, the latest one does.
      */
     ///@{
 
     /** Fails one call of a function. @param number 1 for the next call, 2 for the one after it... */
     void failCall(const std::string& function, int number, CMPIrc rc);
 
-    /** Fails every call of a function from now on. */
+    /** Fails all following calls of a function. */
     void failEvery(const std::string& function, CMPIrc rc);
 
     /**
-     * Lets one call, or every one from now on, answer null, 0 or null data with the status CMPI_RC_OK: a string whose
-     * characters are null (CMPIStringFT.getCharPtr), a path whose namespace is a null string
-     * (CMPIObjectPathFT.getNameSpace), no object from a maker...
+     * Lets one call, or all following ones, return null, 0 or null data with the status CMPI_RC_OK: null characters
+     * (CMPIStringFT.getCharPtr), a null namespace (CMPIObjectPathFT.getNameSpace), no new object and so on.
      */
     void answerNothing(const std::string& function, int number);
     void answerNothingEver(const std::string& function);
 
     /**
-     * Lets a function that answers CMPIData by name (CMPIObjectPathFT.getKey, CMPIInstanceFT.getProperty,
-     * CMPIContextFT.getEntry, CMPIArgsFT.getArg) answer this for a name, in any letter case. Objects in the data
-     * must live as long as the provider may look at them: make them with the functions below.
+     * Lets a function that returns CMPIData by name (CMPIObjectPathFT.getKey, CMPIInstanceFT.getProperty,
+     * CMPIContextFT.getEntry, CMPIArgsFT.getArg) return this for a case-insensitive name. Objects in the data must
+     * outlive the calls: create them with the functions below.
      */
     void answerData(const std::string& function, const std::string& name, const CMPIData& data, CMPIrc rc = CMPI_RC_OK);
 
@@ -100,12 +96,12 @@ public:
      */
     void answerState(const std::string& function, CMPIValueState valueState);
 
-    /** Takes all orders back; poses stay. */
-    void obey();
+    /** Removes all failures. The emulation remains. */
+    void cancelFailures();
     ///@}
 
-    /** @name Objects for orders
-     * They live as long as the broker; making them is not recorded.
+    /** @name Objects for failures
+     * Owned by the broker. Their creation is not recorded.
      */
     ///@{
     CMPIString* string(const std::string& text);
@@ -117,22 +113,22 @@ public:
     ///@}
 
     /** @name Object managers
-     * Both before the provider has the handle.
+     * Call both before the provider receives the handle.
      */
     ///@{
 
-    /** Has the function tables of that object manager from now on: versions, functions that are null. */
+    /** Uses the function tables of an object manager: versions, functions that are null. */
     void emulate(Manager manager);
 
-    /** Knows classes from now on: their instances begin with their keys. */
+    /** Sets the known classes. Their new instances have their keys as properties. */
     void know(cimhost::ClassInfoLookup classes);
     ///@}
 
     /** @name Up-calls
-     * What the broker's enumerateInstances and enumerateInstanceNames answer for a class, in any namespace: the
-     * instances as given, in order; CMPI_RC_ERR_INVALID_CLASS for a class that is not served. All other up-calls are
-     * not supported. For failures while the provider walks through them fail "CMPIEnumerationFT.hasNext",
-     * "CMPIEnumerationFT.getNext" or "CMPIInstanceFT.getObjectPath" at the call wanted.
+     * Set the responses to enumerateInstances and enumerateInstanceNames of a class, in all namespaces. For other
+     * classes, the response is CMPI_RC_ERR_INVALID_CLASS; other up-calls are not supported. For failures while the
+     * provider iterates over the instances, fail "CMPIEnumerationFT.hasNext", "CMPIEnumerationFT.getNext" or
+     * "CMPIInstanceFT.getObjectPath".
      */
     ///@{
     void serve(const std::string& className, std::vector<cimhost::Instance> instances);

@@ -4,7 +4,7 @@
 
 namespace testsupport {
 
-/** The process's umask while this lives. */
+/** Sets the process's umask while it exists. */
 class Umask {
 public:
     explicit Umask(mode_t mask) : before(umask(mask)) {}

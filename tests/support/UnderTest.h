@@ -9,9 +9,9 @@
 namespace testsupport {
 
 /**
- * The file that tests work on: the one that was built, or, where LAW_UNDER_TEST lists directories (separated by
- * colons), the one of the same name in the first that has it, with which the same tests look at an installation.
- * @throws std::runtime_error  none of those directories has it
+ * The file to test: the built one or, if LAW_UNDER_TEST is a list of directories (separated by colons), the file of the
+ * same name in the first directory that contains it, so that the tests can run with an installation.
+ * @throws std::runtime_error if none of the directories contains it
  */
 inline std::string underTest(const std::filesystem::path& built) {
     const char* list = std::getenv("LAW_UNDER_TEST");

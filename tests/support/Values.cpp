@@ -81,13 +81,13 @@ const cimhost::Value* find(const std::vector<cimhost::NamedValue>& values, const
     return found == values.end() ? nullptr : &found->value;
 }
 
-std::optional<std::string> textOf(const std::vector<cimhost::NamedValue>& values, const std::string& name) {
+std::optional<std::string> stringOf(const std::vector<cimhost::NamedValue>& values, const std::string& name) {
     return valueOf<std::string>(values, name);
 }
 
 std::optional<std::string> dateTimeOf(const std::vector<cimhost::NamedValue>& values, const std::string& name) {
     const auto found = valueOf<cimhost::DateTime>(values, name);
-    return found ? std::optional<std::string>(found->text) : std::nullopt;
+    return found ? std::optional<std::string>(found->value) : std::nullopt;
 }
 
 std::optional<cimhost::ObjectPath> referenceOf(const std::vector<cimhost::NamedValue>& values,

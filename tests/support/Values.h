@@ -9,7 +9,7 @@
 
 #include "model/Value.h"
 
-// Plain values, object paths and instances for tests, and looking into them.
+// Builds and reads plain values, object paths and instances.
 
 namespace testsupport {
 
@@ -31,15 +31,15 @@ cimhost::Value nullOf(CMPIType type);
 
 cimhost::NamedValue named(std::string name, cimhost::Value value);
 
-/** A path in a namespace; without keys, that of a class. */
+/** A path in a namespace; without keys, of a class. */
 cimhost::ObjectPath objectPath(std::string nameSpace, std::string className,
                                std::vector<cimhost::NamedValue> keys = {});
 
 cimhost::Instance instance(cimhost::ObjectPath path, std::vector<cimhost::NamedValue> properties = {});
 
-/** @name Looking into paths and instances
- * By name, exactly as spelled. Null or none when there is no such name; the typed ones also when the value is null or
- * of another type.
+/** @name Reading paths and instances
+ * Names are case-sensitive. The result is null or none if there is no such name; of typed functions, also if the value
+ * is null or has another type.
  */
 ///@{
 const cimhost::Value* find(const std::vector<cimhost::NamedValue>& values, const std::string& name);
@@ -47,23 +47,23 @@ const cimhost::Value* find(const std::vector<cimhost::NamedValue>& values, const
 template <class Type>
 std::optional<Type> valueOf(const std::vector<cimhost::NamedValue>& values, const std::string& name) {
     const cimhost::Value* value = find(values, name);
-    const bool isThere =
+    const bool exists =
         value != nullptr && !value->isNull && !value->isArray && std::holds_alternative<Type>(value->elements.front());
-    return isThere ? std::optional<Type>(std::get<Type>(value->elements.front())) : std::nullopt;
+    return exists ? std::optional<Type>(std::get<Type>(value->elements.front())) : std::nullopt;
 }
 
-std::optional<std::string> textOf(const std::vector<cimhost::NamedValue>& values, const std::string& name);
+std::optional<std::string> stringOf(const std::vector<cimhost::NamedValue>& values, const std::string& name);
 std::optional<std::string> dateTimeOf(const std::vector<cimhost::NamedValue>& values, const std::string& name);
 std::optional<cimhost::ObjectPath> referenceOf(const std::vector<cimhost::NamedValue>& values, const std::string& name);
 
-/** Whether there is a null value of that name. */
+/** Whether there is a null value of this name. */
 bool isNull(const std::vector<cimhost::NamedValue>& values, const std::string& name);
 
 /** The names, in order. */
 std::vector<std::string> namesOf(const std::vector<cimhost::NamedValue>& values);
 ///@}
 
-/** The path as text, "root/cimv2:Class.Key=\"x\"". */
+/** The path as WBEM URI, "root/cimv2:Class.Key=\"x\"". */
 std::string toText(const cimhost::ObjectPath& path);
 
 }  // namespace testsupport

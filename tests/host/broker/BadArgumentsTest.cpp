@@ -5,11 +5,11 @@
 #include "BrokerFixture.h"
 #include "broker/FunctionTables.h"
 
-// Whatever a provider hands over, the broker answers a status and lives.
+// The broker returns a status for any argument, and does not crash.
 
 namespace {
 
-/** Whether every pointer of a table is set. What stands before them are numbers, as long as one pointer. */
+/** Whether all pointers of a table are set. The numbers before them have the size of a pointer. */
 template <class Table>
 bool isFilled(const Table& table) {
     std::array<const void*, sizeof(Table) / sizeof(void*)> words{};
@@ -36,7 +36,7 @@ TEST(FunctionTablesTest, HaveNoEmptySlot) {
     EXPECT_TRUE(isFilled(tables.error));
 }
 
-/** An argument that is nothing; where a function wants to tell its status, the place for it. */
+/** A null argument; for a status parameter, a status. */
 template <class Argument>
 Argument nothing(CMPIStatus& status) {
     if constexpr (std::is_same_v<Argument, CMPIStatus*>) {
@@ -46,7 +46,7 @@ Argument nothing(CMPIStatus& status) {
     }
 }
 
-/** Calls a function on an object with nothing else and gives the status it ends with. */
+/** Calls a function of an object with null arguments. @return its status */
 template <class Result, class First, class... Others>
 CMPIrc rcOn(Result (*function)(First, Others...), std::decay_t<First> first) {
     CMPIStatus status{CMPI_RC_OK, nullptr};
@@ -58,7 +58,7 @@ CMPIrc rcOn(Result (*function)(First, Others...), std::decay_t<First> first) {
     }
 }
 
-/** The statuses of functions called on one object, in their order. */
+/** The statuses of functions of one object, in order. */
 template <class Handle, class... Functions>
 std::vector<CMPIrc> statusesOn(Handle* object, Functions... functions) {
     return {rcOn(functions, object)...};
@@ -144,7 +144,7 @@ TEST_F(BadArgumentsTest, NoBrokerIsAnInvalidHandle) {
     m.freeSelectExp(nullptr, nullptr);
 }
 
-TEST_F(BadArgumentsTest, ObjectsRefuseNullArguments) {
+TEST_F(BadArgumentsTest, ObjectsRejectNullArguments) {
     const auto& p = tables.objectPath;
     expectNothingRefused(newPath(), p.setNameSpace, p.setHostname, p.setClassName, p.addKey, p.getKey, p.getKeyAt,
                          p.setNameSpaceFromObjectPath, p.setHostAndNameSpaceFromObjectPath);
@@ -155,7 +155,7 @@ TEST_F(BadArgumentsTest, ObjectsRefuseNullArguments) {
     expectNothingRefused(scope->context({}), tables.context.addEntry, tables.context.getEntry);
 }
 
-TEST_F(BadArgumentsTest, TheBrokerRefusesNullArguments) {
+TEST_F(BadArgumentsTest, TheBrokerRejectsNullArguments) {
     const auto& b = tables.broker;
     expectNothingRefused(handle(), b.attachThread, b.detachThread, b.deliverIndication, b.enumerateInstanceNames,
                          b.getInstance, b.createInstance, b.modifyInstance, b.deleteInstance, b.execQuery,
@@ -166,7 +166,7 @@ TEST_F(BadArgumentsTest, TheBrokerRefusesNullArguments) {
                          e.newSelectExp, e.classPathIsA, e.toString, e.isOfType, e.getType, e.openMessageFile);
 }
 
-TEST_F(BadArgumentsTest, ThreadFunctionsRefuseNullArguments) {
+TEST_F(BadArgumentsTest, ThreadFunctionsRejectNullArguments) {
     const auto& x = tables.threads;
     EXPECT_EQ(x.resolveFileName(nullptr), nullptr);
     EXPECT_EQ(x.newThread(nullptr, nullptr, 0), nullptr);

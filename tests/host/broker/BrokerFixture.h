@@ -28,24 +28,24 @@ protected:
         return make().newInstance(handle(), newPath(className), &status);
     }
 
-    /** Characters of a string object; "(null)" for none. */
+    /** The characters of a string object; "(null)" if there are none. */
     static std::string characters(const CMPIString* string) {
         return string == nullptr ? "(null)" : string->ft->getCharPtr(string, nullptr);
     }
 
     cimhost::Broker broker;
     std::unique_ptr<cimhost::RequestScope> scope;
-    CMPIStatus status{CMPI_RC_ERROR, nullptr};  ///< of the last call that was given it
+    CMPIStatus status{CMPI_RC_ERROR, nullptr};  ///< of the last call that received it
 };
 
-/** A value in the form that table functions take. */
+/** A value as a parameter of table functions. */
 inline CMPIValue uint32Value(CMPIUint32 number) {
     CMPIValue value{};
     value.uint32 = number;
     return value;
 }
 
-/** Characters in the place of a value, as CMPI_chars has them. */
+/** Characters as a value of type CMPI_chars. */
 inline const CMPIValue* charsValue(const char* text) {
     return reinterpret_cast<const CMPIValue*>(text);
 }

@@ -2,8 +2,7 @@
 
 #include "BrokerFixture.h"
 
-// The broker under several requests at a time: each thread's objects are its own, and what threads share takes them
-// all.
+// Concurrent requests: each thread has separate objects, and shared objects support all threads.
 
 namespace {
 
@@ -14,7 +13,7 @@ constexpr int rounds = 200;
 
 class BrokerConcurrencyTest : public BrokerTest {
 protected:
-    /** Runs the body in many threads many times, each time in a request of its own. */
+    /** Runs the body many times in many threads, each time in a separate request. */
     template <class Body>
     void inManyRequests(Body body) {
         std::vector<std::thread> threads;
@@ -61,7 +60,7 @@ TEST_F(BrokerConcurrencyTest, ClonesOutliveTheirRequestsAndEndWithTheirRelease) 
     EXPECT_EQ(broker.lasting().size(), before);
 }
 
-TEST_F(BrokerConcurrencyTest, MarksAreTheRequestsOwn) {
+TEST_F(BrokerConcurrencyTest, MarksBelongToTheirRequest) {
     inManyRequests([&](RequestScope& request, const std::string& name) {
         CMPIStatus rc{};
         const CMPIGcStat* mark = handle()->mft->mark(handle(), &rc);
@@ -72,7 +71,7 @@ TEST_F(BrokerConcurrencyTest, MarksAreTheRequestsOwn) {
     });
 }
 
-TEST_F(BrokerConcurrencyTest, MemoryIsGivenAndTakenBack) {
+TEST_F(BrokerConcurrencyTest, MemoryIsAllocatedAndFreed) {
     inManyRequests([&](RequestScope&, const std::string& name) {
         char* text = handle()->mft->cmpiStrDup(handle(), name.c_str());
         ASSERT_STREQ(text, name.c_str());

@@ -29,7 +29,7 @@ TEST_F(InstanceTest, OfAnUnknownClassStartsEmpty) {
     EXPECT_EQ(instance->ft->getPropertyCount(instance, nullptr), 0U);
 }
 
-TEST_F(InstanceTest, GivesItsPathAsItWasGiven) {
+TEST_F(InstanceTest, ReturnsItsPathUnchanged) {
     CMPIObjectPath* path = newPath("VELKO_Thing");
     path->ft->addKey(path, "Name", charsValue("n"), CMPI_chars);
     const CMPIInstance* instance = make().newInstance(handle(), path, nullptr);
@@ -108,7 +108,7 @@ TEST_F(InstanceTest, KeepsAnEmbeddedInstance) {
     EXPECT_EQ(characters(kept->ft->getProperty(kept, "P", nullptr).value.string), "1");
 }
 
-TEST_F(InstanceTest, RefusesTypesThatAreNone) {
+TEST_F(InstanceTest, RejectsInvalidTypes) {
     CMPIInstance* instance = newInstance();
     const CMPIValue value{};
     EXPECT_EQ(instance->ft->setProperty(instance, "P", &value, CMPI_enumeration).rc, CMPI_RC_ERR_INVALID_DATA_TYPE);
@@ -116,14 +116,14 @@ TEST_F(InstanceTest, RefusesTypesThatAreNone) {
     EXPECT_EQ(instance->ft->getPropertyCount(instance, nullptr), 0U);
 }
 
-TEST_F(InstanceTest, RefusesAnObjectOfAnotherType) {
+TEST_F(InstanceTest, RejectsAnObjectOfAnotherType) {
     CMPIInstance* instance = newInstance();
     CMPIValue value{};
     value.ref = newPath();
     EXPECT_EQ(instance->ft->setProperty(instance, "P", &value, CMPI_string).rc, CMPI_RC_ERR_INVALID_PARAMETER);
 }
 
-TEST_F(InstanceTest, TellsAMissingProperty) {
+TEST_F(InstanceTest, ReportsAMissingProperty) {
     const CMPIInstance* instance = newInstance();
     EXPECT_EQ(instance->ft->getProperty(instance, "P", &status).state, CMPI_badValue);
     EXPECT_EQ(status.rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);
@@ -145,7 +145,7 @@ TEST_F(InstanceTest, AFilterDropsPropertiesSetBeforeAndAfter) {
     EXPECT_THAT(names(instance), testing::ElementsAre("B", "D", "C"));
 }
 
-/** A broker that knows the class Known with the key Name. */
+/** A broker with the class Known, whose key is Name. */
 class KnownClassTest : public InstanceTest {
 protected:
     static cimhost::BrokerOptions options() {
@@ -179,7 +179,7 @@ TEST_F(KnownClassTest, AnInstanceStartsWithTheKeysOfItsPath) {
     EXPECT_EQ(instance->ft->getProperty(instance, "Name", nullptr).state, CMPI_keyValue);
 }
 
-TEST_F(KnownClassTest, AKeyStandsWhereItIsSet) {
+TEST_F(KnownClassTest, AKeyIsWhereItIsSet) {
     CMPIInstance* instance = known();
     const CMPIValue number = uint32Value(7);
     instance->ft->setProperty(instance, "Other", &number, CMPI_uint32);
@@ -202,7 +202,7 @@ TEST_F(KnownClassTest, AKeySetAgainStaysWhereItIs) {
     EXPECT_EQ(characters(key.value.string), "second");
 }
 
-TEST_F(KnownClassTest, AKeyOfACloneStandsWhereTheCloneSetsIt) {
+TEST_F(KnownClassTest, AKeyOfACloneIsWhereTheCloneSetsIt) {
     CMPIInstance* original = known();
     CMPIInstance* clone = original->ft->clone(original, &status);
     ASSERT_NE(clone, nullptr);
@@ -223,7 +223,7 @@ TEST_F(KnownClassTest, ChecksNamesAndTypes) {
     EXPECT_EQ(set(instance, "Unknown", "1").rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);
 }
 
-TEST_F(KnownClassTest, AFilterLeavesTheKeys) {
+TEST_F(KnownClassTest, AFilterKeepsTheKeys) {
     CMPIInstance* instance = known();
     const CMPIValue number = uint32Value(7);
     instance->ft->setProperty(instance, "Other", &number, CMPI_uint32);
@@ -232,7 +232,7 @@ TEST_F(KnownClassTest, AFilterLeavesTheKeys) {
     EXPECT_THAT(names(instance), testing::ElementsAre("Name"));
 }
 
-TEST_F(KnownClassTest, APathIsOfItsClassAndItsSuperclasses) {
+TEST_F(KnownClassTest, APathIsAnInstanceOfItsClassAndSuperclasses) {
     const auto isA = [&](const char* name) {
         return knowing.handle()->eft->classPathIsA(knowing.handle(), knownPath(), name, &status);
     };

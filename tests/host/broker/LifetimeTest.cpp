@@ -2,13 +2,13 @@
 
 #include "BrokerFixture.h"
 
-// These tests mean most under the address sanitizer, which sees what is used too late and what is never freed.
+// The address sanitizer also finds uses after release and leaks in these tests.
 
 namespace {
 
 class LifetimeTest : public BrokerTest {};
 
-TEST_F(LifetimeTest, ARequestOwnsWhatIsMadeInIt) {
+TEST_F(LifetimeTest, ARequestOwnsTheObjectsCreatedInIt) {
     newString("a");
     newInstance();
     EXPECT_EQ(scope->arena().size(), 3U) << "a string, a path and an instance";
@@ -21,7 +21,7 @@ TEST_F(LifetimeTest, ARequestOwnsWhatIsMadeInIt) {
     EXPECT_EQ(scope->arena().size(), 4U);
 }
 
-TEST_F(LifetimeTest, WhatIsReadFromAnObjectBelongsToTheRequestThatAsks) {
+TEST_F(LifetimeTest, AnObjectReadFromAnotherBelongsToTheCurrentRequest) {
     const CMPIObjectPath* path = newPath();
     cimhost::RequestScope inner(broker);
     path->ft->getNameSpace(path, nullptr);
@@ -35,7 +35,7 @@ TEST_F(LifetimeTest, OutsideOfRequestsObjectsLiveAsLongAsTheBroker) {
     EXPECT_EQ(characters(string), "lasting");
 }
 
-TEST_F(LifetimeTest, UseAfterReleaseIsTold) {
+TEST_F(LifetimeTest, UseAfterReleaseIsReported) {
     CMPIString* string = newString("gone");
     EXPECT_EQ(string->ft->release(string).rc, CMPI_RC_OK);
     EXPECT_EQ(string->ft->getCharPtr(string, &status), nullptr);
@@ -92,7 +92,7 @@ TEST_F(LifetimeTest, EveryTypeCanBeClonedAndReleased) {
     check(scope->arena().make<CMPIEnumeration>({CMPI_uint8, {std::uint8_t{1}}, 0}));
 }
 
-TEST_F(LifetimeTest, ReleasingAMarkFreesWhatCameAfterIt) {
+TEST_F(LifetimeTest, ReleasingAMarkFreesLaterObjects) {
     const CMPIBrokerMemFT& memory = *handle()->mft;
     CMPIString* before = newString("before");
     CMPIGcStat* mark = memory.mark(handle(), &status);
@@ -137,7 +137,7 @@ TEST_F(LifetimeTest, MemoryIsFreedAtTheLatestWithTheBroker) {
     EXPECT_EQ(memory.cmpiRealloc(handle(), &foreign, 8), nullptr);
 }
 
-TEST_F(LifetimeTest, AnAttachedThreadHasObjectsOfItsOwn) {
+TEST_F(LifetimeTest, AnAttachedThreadHasSeparateObjects) {
     const CMPIContext* context = scope->context({testsupport::named(CMPIPrincipal, testsupport::text("me"))});
     CMPIContext* prepared = handle()->bft->prepareAttachThread(handle(), context);
     ASSERT_NE(prepared, nullptr);
@@ -155,7 +155,7 @@ TEST_F(LifetimeTest, AnAttachedThreadHasObjectsOfItsOwn) {
     EXPECT_EQ(handle()->bft->attachThread(handle(), context).rc, CMPI_RC_ERR_INVALID_HANDLE);
 }
 
-TEST_F(LifetimeTest, APreparedThreadThatNeverComesIsFreed) {
+TEST_F(LifetimeTest, APreparedThreadThatIsNeverAttachedIsFreed) {
     EXPECT_NE(handle()->bft->prepareAttachThread(handle(), scope->context({})), nullptr);
 }
 

@@ -57,7 +57,7 @@ TEST_F(ObjectPathTest, ReplacesAKeyInItsPlace) {
     EXPECT_EQ(characters(key.value.string), "3");
 }
 
-TEST_F(ObjectPathTest, RefusesAKeyWithoutNameOrValue) {
+TEST_F(ObjectPathTest, RejectsAKeyWithoutNameOrValue) {
     CMPIObjectPath* path = newPath();
     EXPECT_EQ(path->ft->addKey(path, nullptr, charsValue("1"), CMPI_chars).rc, CMPI_RC_ERR_INVALID_PARAMETER);
     EXPECT_EQ(path->ft->addKey(path, "", charsValue("1"), CMPI_chars).rc, CMPI_RC_ERR_INVALID_PARAMETER);
@@ -65,7 +65,7 @@ TEST_F(ObjectPathTest, RefusesAKeyWithoutNameOrValue) {
     EXPECT_EQ(path->ft->getKeyCount(path, nullptr), 0U);
 }
 
-TEST_F(ObjectPathTest, TellsAMissingKey) {
+TEST_F(ObjectPathTest, ReportsAMissingKey) {
     const CMPIObjectPath* path = newPath();
     EXPECT_EQ(path->ft->getKey(path, "A", &status).state, CMPI_badValue);
     EXPECT_EQ(status.rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);
@@ -85,7 +85,7 @@ TEST_F(ObjectPathTest, KeepsAReferenceAsItWasWhenAdded) {
     EXPECT_EQ(characters(key.value.ref->ft->getClassName(key.value.ref, nullptr)), "Target");
 }
 
-TEST_F(ObjectPathTest, WritesItselfAsText) {
+TEST_F(ObjectPathTest, IsFormattedAsAUri) {
     CMPIObjectPath* path = newPath("VELKO_Thing");
     path->ft->addKey(path, "Name", charsValue("a"), CMPI_chars);
     EXPECT_EQ(characters(path->ft->toString(path, nullptr)), "root/cimv2:VELKO_Thing.Name=\"a\"");

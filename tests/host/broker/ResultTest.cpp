@@ -36,7 +36,7 @@ TEST_F(ResultTest, CollectsEverythingInOrder) {
     EXPECT_EQ(cimhost::doneCount(events), 2);
 }
 
-TEST_F(ResultTest, KeepsWhatWasReturnedAsItWas) {
+TEST_F(ResultTest, KeepsResultsUnchanged) {
     CMPIInstance* instance = newInstance();
     instance->ft->setProperty(instance, "P", charsValue("before"), CMPI_chars);
     result->ft->returnInstance(result, instance);
@@ -45,10 +45,10 @@ TEST_F(ResultTest, KeepsWhatWasReturnedAsItWas) {
     scope.reset();
     const auto returned = eventsOf<Instance>(events);
     ASSERT_EQ(returned.size(), 1U);
-    EXPECT_EQ(testsupport::textOf(returned.front().properties, "P"), "before");
+    EXPECT_EQ(testsupport::stringOf(returned.front().properties, "P"), "before");
 }
 
-TEST_F(ResultTest, RefusesWhatIsNoObject) {
+TEST_F(ResultTest, RejectsInvalidObjects) {
     EXPECT_EQ(result->ft->returnInstance(result, nullptr).rc, CMPI_RC_ERR_INVALID_PARAMETER);
     EXPECT_EQ(result->ft->returnObjectPath(result, nullptr).rc, CMPI_RC_ERR_INVALID_PARAMETER);
     EXPECT_EQ(result->ft->returnError(result, nullptr).rc, CMPI_RC_ERR_INVALID_PARAMETER);

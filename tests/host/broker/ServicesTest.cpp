@@ -28,7 +28,7 @@ TEST_F(ServicesTest, KnowsTheTypesOfObjects) {
     EXPECT_EQ(status.rc, CMPI_RC_OK);
 }
 
-TEST_F(ServicesTest, WritesObjectsAsText) {
+TEST_F(ServicesTest, DescribesObjects) {
     EXPECT_EQ(characters(make().toString(handle(), newString("s"), nullptr)), "s");
     EXPECT_EQ(characters(make().toString(handle(), newPath("C"), nullptr)), "root/cimv2:C");
     CMPIInstance* instance = newInstance("C");
@@ -81,9 +81,9 @@ TEST_F(ServicesTest, PassesLogAndTraceRecordsOn) {
     EXPECT_FALSE(records[0].isTrace);
     EXPECT_EQ(records[0].level, CMPI_SEV_WARNING);
     EXPECT_EQ(records[0].component, "id");
-    EXPECT_EQ(records[0].text, "text");
+    EXPECT_EQ(records[0].message, "text");
     EXPECT_TRUE(records[1].isTrace);
-    EXPECT_EQ(records[1].text, "string");
+    EXPECT_EQ(records[1].message, "string");
 }
 
 TEST_F(ServicesTest, ALoggerThatThrowsIsAFailure) {
@@ -126,7 +126,7 @@ TEST_F(ServicesTest, AThreadCanExit) {
     EXPECT_EQ(answer, &threads);
 }
 
-/** What two threads share. */
+/** Shared by two threads. */
 struct Meeting {
     const CMPIBrokerExtFT* threads;
     void* mutex;

@@ -76,17 +76,17 @@ TEST_F(UpCallTest, AnEnumerationIsWalkedThroughOnce) {
     EXPECT_EQ(all->ft->getSize(all, nullptr), 2U);
 }
 
-TEST_F(UpCallTest, ContextAndPropertyListGoAlong) {
+TEST_F(UpCallTest, ContextAndPropertyListArePassed) {
     const char* list[] = {"A", "B", nullptr};
     up().enumerateInstances(caller(), context, newPath(), list, &status);
-    EXPECT_EQ(testsupport::textOf(echo.last.context, "Mine"), "kept");
+    EXPECT_EQ(testsupport::stringOf(echo.last.context, "Mine"), "kept");
     EXPECT_EQ(echo.last.properties, (std::vector<std::string>{"A", "B"}));
     up().enumerateInstances(caller(), nullptr, newPath(), nullptr, &status);
     EXPECT_EQ(status.rc, CMPI_RC_OK);
     EXPECT_EQ(echo.last.properties, std::nullopt);
 }
 
-TEST_F(UpCallTest, AFilterKeepsNullAndEmptyApart) {
+TEST_F(UpCallTest, AFilterDistinguishesNullAndEmpty) {
     up().associatorNames(caller(), context, newPath(), "Assoc", "", nullptr, "Role", &status);
     EXPECT_EQ(status.rc, CMPI_RC_OK);
     EXPECT_EQ(echo.last.filter.associationClass, "Assoc");
@@ -113,7 +113,7 @@ TEST_F(UpCallTest, MethodsHaveOutput) {
     EXPECT_EQ(output->ft->getArgCount(output, nullptr), 1U);
 }
 
-TEST_F(UpCallTest, FailuresComeWithTheirText) {
+TEST_F(UpCallTest, FailuresHaveTheirMessages) {
     EXPECT_EQ(up().enumerateInstances(caller(), context, newPath("Failing"), nullptr, &status), nullptr);
     EXPECT_EQ(status.rc, CMPI_RC_ERR_ACCESS_DENIED);
     EXPECT_EQ(characters(status.msg), "not you");
@@ -122,7 +122,7 @@ TEST_F(UpCallTest, FailuresComeWithTheirText) {
     EXPECT_EQ(characters(status.msg), "broken");
 }
 
-TEST_F(UpCallTest, WhatNobodyAnswersIsNotSupported) {
+TEST_F(UpCallTest, UnimplementedOperationsAreNotSupported) {
     EXPECT_EQ(up().modifyInstance(caller(), context, newPath(), newInstance(), nullptr).rc, CMPI_RC_ERR_NOT_SUPPORTED);
     EXPECT_EQ(up().execQuery(caller(), context, newPath(), "q", "WQL", &status), nullptr);
     EXPECT_EQ(status.rc, CMPI_RC_ERR_NOT_SUPPORTED);

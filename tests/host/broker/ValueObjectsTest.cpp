@@ -21,7 +21,7 @@ TEST_F(ArrayTest, KeepsItsElements) {
     EXPECT_EQ(array->ft->getElementAt(array, 1, nullptr).state, CMPI_nullValue);
 }
 
-TEST_F(ArrayTest, RefusesWrongTypesAndPositions) {
+TEST_F(ArrayTest, RejectsWrongTypesAndPositions) {
     CMPIArray* array = make().newArray(handle(), 1, CMPI_uint32, nullptr);
     const CMPIValue value = uint32Value(1);
     EXPECT_EQ(array->ft->setElementAt(array, 0, &value, CMPI_uint16).rc, CMPI_RC_ERR_TYPE_MISMATCH);
@@ -58,7 +58,7 @@ protected:
     CMPIUint64 binary(const CMPIDateTime* time) { return time->ft->getBinaryFormat(time, &status); }
 };
 
-TEST_F(DateTimeTest, OfTextKeepsItsText) {
+TEST_F(DateTimeTest, KeepsItsString) {
     const CMPIDateTime* time = fromText("20240229235959.123456+060");
     ASSERT_NE(time, nullptr);
     EXPECT_EQ(text(time), "20240229235959.123456+060");
@@ -86,7 +86,7 @@ TEST_F(DateTimeTest, IntervalsHaveBothForms) {
     EXPECT_EQ(binary(fromText("99999999235959.999999:000")), 8639999999999999999ULL);
 }
 
-TEST_F(DateTimeTest, RefusesWhatIsNoDateTime) {
+TEST_F(DateTimeTest, RejectsStringsThatAreNoDateTimes) {
     for (const char* bad : {"", "20241301000000.000000+000", "20230229000000.000000+000", "20240229235959.123456+06",
                             "20240229 35959.123456+060", "00000001250101.000007:000"}) {
         EXPECT_EQ(fromText(bad), nullptr) << bad;

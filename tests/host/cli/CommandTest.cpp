@@ -79,7 +79,7 @@ TEST(CreateInstance, AKeyMayStandInThePathOrAmongTheValues) {
     EXPECT_THAT(run({"ci", "Test_Box", "--null", "Name"}).error, HasSubstr("key Name cannot be null"));
 }
 
-TEST(CreateInstance, WhatIsThereAlreadyIsError11) {
+TEST(CreateInstance, AnExistingInstanceIsError11) {
     const Ended created = run({"ci", boxA});
     EXPECT_EQ(created.status, 1);
     EXPECT_EQ(created.error, "cimhost: error 11 (CMPI_RC_ERR_ALREADY_EXISTS): there is a box A\n");
@@ -127,7 +127,7 @@ TEST(DeleteInstance, SaysNothingWhenItSucceedsAndWhyWhenItDoesNot) {
     EXPECT_EQ(missing.status, 1);
     EXPECT_EQ(missing.error,
               "cimhost: error 6 (CMPI_RC_ERR_NOT_FOUND): no such box\n"
-              "Run cimhost enumerate-instance-names Test_Box for those that there are.\n");
+              "Run cimhost enumerate-instance-names Test_Box to list the instances.\n");
 }
 
 TEST(Associators, ShowTheInstancesAtTheOtherEnd) {
@@ -169,7 +169,7 @@ TEST(Error, OfAClassWithoutProviderIsError5AndOfAnUnknownNamespaceError3) {
                 AllOf(StartsWith("cimhost: error 5 (CMPI_RC_ERR_INVALID_CLASS): "), HasSubstr("--schema")));
 }
 
-TEST(Error, EveryProviderStatusComesThroughWithCodeAndName) {
+TEST(Error, EachProviderStatusIsShownWithCodeAndName) {
     const Ended failed = run({"gi", "Test_Answer.Code=13"});
     EXPECT_EQ(failed.status, 1);
     EXPECT_EQ(failed.output, "");

@@ -29,7 +29,7 @@ TEST(Location, OptionsComeBeforeTheEnvironment) {
     EXPECT_THAT(listed.output, AllOf(StartsWith("Other "), HasSubstr("Test_Box"), HasSubstr("(not in the schema)")));
 }
 
-TEST(Location, ADirectoryStandsForItsFilesAndSeveralMayBeNamed) {
+TEST(Location, ADirectoryMeansItsFilesAndSeveralCanBeNamed) {
     const TemporaryDirectory directory;
     directory.write("a/2.mof", "class Two : One {};");
     directory.write("a/1.mof", "class One { [Key] string K; };");
@@ -70,7 +70,7 @@ INSTANTIATE_TEST_SUITE_P(
     testing::Values(
         MissingFile{{"--schema", "/no/such.mof", "classes"}, "/no/such.mof: this file does not exist"},
         MissingFile{{"--registration", "/no/such.reg", "classes"}, "/no/such.reg: this file does not exist"},
-        MissingFile{{"--library-path", "/no/such", "classes"}, "/no/such: there is no such directory of libraries"},
+        MissingFile{{"--library-path", "/no/such", "classes"}, "/no/such: this library directory does not exist"},
         MissingFile{{"--schema", dataFile("test.reg"), "classes"}, "test.reg:1:3: expected \"pragma\" after #"},
         MissingFile{{"--registration", dataFile("test.mof"), "classes"}, "test.mof:1: expected [CLASS]"},
         MissingFile{{"ei", "Test_NoLibrary"}, "libno_such_library.so"},

@@ -24,7 +24,7 @@ std::string contentOf(const std::filesystem::path& file) {
     return text.str();
 }
 
-/** The arrays that exec wants, ended by a null pointer. */
+/** The array for exec, terminated by a null pointer. */
 std::vector<char*> pointersTo(std::vector<std::string>& texts) {
     std::vector<char*> pointers;
     pointers.reserve(texts.size() + 1);
@@ -35,7 +35,7 @@ std::vector<char*> pointersTo(std::vector<std::string>& texts) {
     return pointers;
 }
 
-/** The environment of this process without the program's own variables, and with those given. */
+/** The environment of this process without the variables of cimhost, and with these. */
 std::vector<std::string> environmentWith(const Environment& more) {
     std::vector<std::string> variables = more;
     for (char** each = environ; *each != nullptr; ++each) {
@@ -86,7 +86,7 @@ void addTestClasses(std::vector<std::string>& arguments) {
                                          "--library-path", PROVIDER_DIRECTORY});
 }
 
-/** What the terminal shows until nobody has it open any more. */
+/** Reads the output on the terminal until the program closes it. */
 std::string shownOn(int terminal) {
     std::string text;
     char block[4096];

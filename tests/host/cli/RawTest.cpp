@@ -47,7 +47,7 @@ TEST(RawOutput, ShowsACodeThatIsNoStatusCodeAsItIs) {
     }
 }
 
-TEST(RawOutput, TellsAnExceptionFromAMessage) {
+TEST(RawOutput, DistinguishesAnExceptionFromAMessage) {
     const Ended thrown = run({"--raw", "gi", "Test_Answer.Code=999"});
     EXPECT_EQ(thrown.status, 1);
     EXPECT_THAT(thrown.output, testing::StartsWith("status: 1 (CMPI_RC_ERR_FAILED)\nexception: "));

@@ -17,7 +17,7 @@ void PrintTo(const Misspelt& line, std::ostream* out) {
 }
 
 class Misspelling : public testing::TestWithParam<Misspelt> {};
-TEST_P(Misspelling, IsAnsweredWithWhatWasPerhapsMeant) {
+TEST_P(Misspelling, IsReportedWithASuggestion) {
     const Ended refused = run(GetParam().arguments);
     EXPECT_NE(refused.status, 0);
     EXPECT_THAT(refused.error, HasSubstr(std::string("did you mean ") + GetParam().suggestion + "?"));
@@ -31,7 +31,7 @@ INSTANTIATE_TEST_SUITE_P(
                     Misspelt{{"ain", "Test_Box.Name=\"A\"", "--assoc-class", "Test_Contain"}, "Test_Contains"},
                     Misspelt{{"mi", "Test_Box.Name=\"A\"", "Sizes=1"}, "Size"}));
 
-TEST(Suggestion, IsNotMadeWhereNothingIsNear) {
+TEST(Suggestion, IsNotMadeIfNothingIsSimilar) {
     EXPECT_THAT(run({"frobnicate"}).error, Not(HasSubstr("did you mean")));
     EXPECT_THAT(run({"ei", "Nothing_Like_It"}).error, Not(HasSubstr("did you mean")));
     EXPECT_THAT(run({"mi", "Test_Box.Name=\"A\"", "Frobnicated=1"}).error, Not(HasSubstr("did you mean")));
@@ -53,8 +53,8 @@ TEST_P(Hint, NamesTheCommandThatHelps) {
 }
 INSTANTIATE_TEST_SUITE_P(
     Failures, Hint,
-    testing::Values(Refused{{"ei", "No_Such"}, "Run cimhost classes for those that are served"},
-                    Refused{{"ei", "root/none:Test_Box"}, "Run cimhost classes for where each class is served"},
+    testing::Values(Refused{{"ei", "No_Such"}, "Run cimhost classes to list the classes"},
+                    Refused{{"ei", "root/none:Test_Box"}, "Run cimhost classes to list the namespaces of each class"},
                     Refused{{"di", "Test_Box.Name=\"none\""}, "Run cimhost enumerate-instance-names Test_Box"},
                     Refused{{"ei", "A", "B"}, "Run cimhost enumerate-instances --help"},
                     Refused{{"frobnicate"}, "Run cimhost --help"}));

@@ -2,7 +2,7 @@
 
 #include <gtest/gtest.h>
 
-// Columns of letters that are wider, or narrower, than one column.
+// Characters that are wider or narrower than one column.
 
 namespace cimhost::test {
 namespace {
@@ -24,7 +24,7 @@ TEST(Columns, AreThoseThatATerminalGives) {
     EXPECT_EQ(columnsOf(std::string(1, '\0')), 1U);
 }
 
-TEST(Columns, StandUnderEachOtherWhateverTheLettersAre) {
+TEST(Columns, AreAlignedWithWideAndNarrowCharacters) {
     const std::vector<text::Row> rows{{wide, "1"}, {"abcd", "2"}, {accented, "3"}};
     EXPECT_EQ(text::aligned(rows, ""), std::string(wide) + "  1\nabcd  2\n" + accented + "     3\n");
 }

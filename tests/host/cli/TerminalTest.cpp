@@ -24,7 +24,7 @@ std::vector<std::size_t> widthsOf(const std::string& text) {
     return widths;
 }
 
-/** The text without blanks and line ends: what wrapping must not change. */
+/** The output without blanks and line ends, which wrapping does not change. */
 std::string squeezed(std::string text) {
     text.erase(std::remove_if(text.begin(), text.end(), [](char each) { return each == ' ' || each == '\n'; }),
                text.end());
@@ -39,7 +39,7 @@ TEST(Colours, AreForTerminalsOnly) {
     EXPECT_THAT(run({"gi", "Test_Box.Name=\"none\""}).error, Not(HasSubstr(escape)));
 }
 
-TEST(Colours, AreLeftOutWhereTheyAreNotWanted) {
+TEST(Colours, AreOmittedIfTheyAreNotWanted) {
     for (const char* variable : {"NO_COLOR=1", "TERM=dumb"}) {
         const Ended shown = runOnTerminal({"ei", "Test_Box"}, wide, {variable});
         EXPECT_EQ(shown.output, run({"ei", "Test_Box"}).output) << variable;
@@ -49,7 +49,7 @@ TEST(Colours, AreLeftOutWhereTheyAreNotWanted) {
                 Not(HasSubstr(escape)));
 }
 
-TEST(Colours, AreThereWhereTheyAreAskedFor) {
+TEST(Colours, AreUsedIfTheyAreRequested) {
     EXPECT_THAT(run({"--color", "always", "ei", "Test_Box"}).output, HasSubstr(escape));
     EXPECT_THAT(run({"--color", "always", "gi", "Test_Box.Name=\"none\""}).error, HasSubstr(escape));
     EXPECT_THAT(runOnTerminal({"--color", "always", "ei", "Test_Box"}, wide, {"NO_COLOR=1"}).output, HasSubstr(escape));
@@ -65,7 +65,7 @@ TEST(Colours, AreNotForPrograms) {
 TEST(Colours, HaveThreeWords) {
     const Ended refused = run({"--color", "blue", "ei", "Test_Box"});
     EXPECT_EQ(refused.status, 2);
-    EXPECT_THAT(refused.error, HasSubstr("blue is not one of auto, always and never"));
+    EXPECT_THAT(refused.error, HasSubstr("blue not in {auto,always,never}"));
 }
 
 class WindowOfAnyWidth : public testing::TestWithParam<unsigned short> {};
@@ -80,21 +80,21 @@ TEST_P(WindowOfAnyWidth, IsNotExceededAndHidesNothing) {
         EXPECT_THAT(widthsOf(shown), Each(Le(GetParam()))) << shown;
     }
 }
-// The narrowest has room for the longest path, which is not divided.
+// The longest path, which is not divided, fits into the narrowest terminal.
 INSTANTIATE_TEST_SUITE_P(Columns, WindowOfAnyWidth, testing::Values(30, 40, 56, 80, 120));
 
-TEST(Window, GoesOnBelowTheLastColumn) {
+TEST(Window, ContinuesBelowTheLastColumn) {
     EXPECT_THAT(runOnTerminal({"--color", "never", "ei", "Test_Box"}, 44).output,
                 HasSubstr("  Labels  string[]   {\"this side \\\"up\\\"\", \n"
                           "                     \"two\\nlines\"}\n"));
 }
 
-TEST(Window, GivesEachCellALineWhereItIsTooNarrow) {
+TEST(Window, PutsEachCellOnALineIfItIsTooNarrow) {
     EXPECT_THAT(runOnTerminal({"--color", "never", "ei", "Test_Box"}, 30).output,
                 HasSubstr("  Shelf\n    sint8\n    -3\n"));
 }
 
-TEST(Window, MayBeToldByAVariable) {
+TEST(Window, CanBeSetByAVariable) {
     EXPECT_EQ(runOnTerminal({"ei", "Test_Box"}, wide, {"COLUMNS=40"}).output,
               runOnTerminal({"ei", "Test_Box"}, 40).output);
     EXPECT_EQ(runOnTerminal({"ei", "Test_Box"}, 40, {"COLUMNS=some"}).output,

@@ -1,5 +1,4 @@
-// A provider of two boxes, one in the other, for tests of the program: it shows what it was given and can answer with
-// any status.
+// A provider of two boxes, one in the other, for tests of the program. It returns what it receives, or any status.
 
 #include <cmpift.h>
 
@@ -11,7 +10,7 @@ namespace {
 
 const CMPIBroker* theBroker = nullptr;
 
-/** Also with a code that is no CMPIrc, which a provider written in C may answer. */
+/** Also for a code that is not a CMPIrc, which a provider written in C may return. */
 CMPIStatus status(int code, const char* message = nullptr) {
     CMPIStatus result{CMPI_RC_OK, nullptr};
     static_assert(sizeof result.rc == sizeof code);
@@ -80,7 +79,7 @@ CMPIStatus done(const CMPIResult* result) {
     return status(CMPI_RC_OK);
 }
 
-/** Answers for the class whose key is a status code; -1 for a request of another class. */
+/** The status for the class whose key is a status code; -1 for other classes. */
 CMPIStatus answer(const CMPIObjectPath* path) {
     const CMPIData code = path->ft->getKey(path, "Code", nullptr);
     if (code.value.uint16 == 999) {
@@ -159,7 +158,7 @@ CMPIStatus deleteInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*
     return nameKey(path) == "A" ? status(CMPI_RC_OK) : status(CMPI_RC_ERR_NOT_FOUND, "no such box");
 }
 
-/** A box whose name says what the request was for. */
+/** A box whose name describes the request. */
 std::string described(const char* first, const char* second, const char* third, const char* fourth) {
     std::string text;
     for (const char* each : {first, second, third, fourth}) {

@@ -74,7 +74,7 @@ instance of Test_Box {
 )");
 }
 
-TEST(MofOutput, ShowsPathsAsTextDoes) {
+TEST(MofOutput, ShowsPathsLikeText) {
     EXPECT_EQ(run({"--format", "mof", "ein", "Test_Box"}).output, run({"ein", "Test_Box"}).output);
 }
 

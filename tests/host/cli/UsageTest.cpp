@@ -19,7 +19,7 @@ TEST(Help, ShowsCommandsOptionsAndExamples) {
     }
 }
 
-TEST(Help, EveryCommandHasItsOwn) {
+TEST(Help, EachCommandHasHelp) {
     for (const char* command : {"ei", "ein", "gi", "ci", "mi", "di", "ai", "ain", "ri", "rin", "classes"}) {
         const Ended help = runBare({command, "--help"});
         EXPECT_EQ(help.status, 0) << command;
@@ -62,13 +62,13 @@ INSTANTIATE_TEST_SUITE_P(
                     WrongLine{{"ei", "A", "B"}, "B"}, WrongLine{{"ei", "A", "--frobnicate"}, "--frobnicate"},
                     WrongLine{{"ei", "A", "--assoc-class", "B"}, "--assoc-class"},
                     WrongLine{{"ei", "A", "--null", "B"}, "--null"}, WrongLine{{"--format"}, "--format"},
-                    WrongLine{{"--format", "xml", "ei", "A"}, "xml is not one of text, json and mof"},
-                    WrongLine{{"--format", "mof", "classes"}, "--format mof shows instances"},
-                    WrongLine{{"--format", "mof", "--raw", "ei", "Test_Box"}, "--format mof shows instances"}));
+                    WrongLine{{"--format", "xml", "ei", "A"}, "xml not in {text,json,mof}"},
+                    WrongLine{{"--format", "mof", "classes"}, "--format mof shows only instances"},
+                    WrongLine{{"--format", "mof", "--raw", "ei", "Test_Box"}, "--format mof shows only instances"}));
 
 INSTANTIATE_TEST_SUITE_P(
     Targets, WrongUsage,
-    testing::Values(WrongLine{{"ei", "Test_Box.Name=\"A\""}, "names an instance; name a class"},
+    testing::Values(WrongLine{{"ei", "Test_Box.Name=\"A\""}, "is the path of an instance; write a class"},
                     WrongLine{{"gi", "Test_Box.Name=A"}, "character 15: expected a key's value"},
                     WrongLine{{"gi", "Test_Box.Name=5"}, "write it in quotation marks, \"5\""},
                     WrongLine{{"gi", "Test_Box.Size=5"}, "class Test_Box has no key Size; its keys are Name"},
@@ -78,15 +78,15 @@ INSTANTIATE_TEST_SUITE_P(
 INSTANTIATE_TEST_SUITE_P(
     Values, WrongUsage,
     testing::Values(WrongLine{{"mi", "Test_Box.Name=\"A\""}, "nothing to modify"},
-                    WrongLine{{"mi", "Test_Box.Name=\"A\"", "Size"}, "Size is no NAME=VALUE"},
-                    WrongLine{{"mi", "Test_Box.Name=\"A\"", "=5"}, "=5 is no NAME=VALUE"},
+                    WrongLine{{"mi", "Test_Box.Name=\"A\"", "Size"}, "Size is not NAME=VALUE"},
+                    WrongLine{{"mi", "Test_Box.Name=\"A\"", "=5"}, "=5 is not NAME=VALUE"},
                     WrongLine{{"mi", "Test_Box.Name=\"A\"", "Size=5", "size=6"}, "property Size is given twice"},
                     WrongLine{{"mi", "Test_Box.Name=\"A\"", "Size=5", "--null", "Size"}, "Size is given twice"},
                     WrongLine{{"mi", "Test_Box.Name=\"A\"", "Sice=5"},
                               "no property Sice; its properties are Name, Size"},
                     WrongLine{{"mi", "Test_Box.Name=\"A\"", "--null", "Sice"}, "no property Sice"},
                     WrongLine{{"mi", "Test_Box.Name=\"A\"", "Size=-1"}, "Size: -1 is not a uint32"},
-                    WrongLine{{"mi", "Test_Box.Name=\"A\"", "Size="}, "Size: an empty text is not a uint32"},
+                    WrongLine{{"mi", "Test_Box.Name=\"A\"", "Size="}, "Size: an empty string is not a uint32"},
                     WrongLine{{"mi", "Test_Box.Name=\"A\"", "Packed=today"}, "Packed: today is not a datetime"},
                     WrongLine{{"mi", "Test_Box.Name=\"A\"", "Labels=a"}, "expected a list of values in braces"},
                     WrongLine{{"mi", "Test_Box.Name=\"A\"", "Inside=Test_Answer.Code=1"}, "must refer to a Test_Box"}));

@@ -5,13 +5,13 @@
 #include "lab/emulation/ManagerEmulation.h"
 
 // Many clients at a time, as every manager: providers are started, ask each other, fail and throw, and every client
-// gets the answers to its own requests.
+// receives the responses to its own requests.
 
 namespace {
 
 using cimhost::Request;
 using cimhost::lab::Manager;
-using testsupport::textOf;
+using testsupport::stringOf;
 
 constexpr int clients = 8;
 constexpr int rounds = 25;
@@ -22,7 +22,7 @@ protected:
 
     void TearDown() override { started.reset(); }  // while there is something to log to
 
-    /** The manager, with a log that takes lines from several threads. */
+    /** The manager, with a thread-safe log. */
     cimhost::ObjectManager& shared() {
         if (!started) {
             options.libraries.searchPath = {TEST_PROVIDERS};
@@ -37,7 +37,7 @@ protected:
         const auto nested =
             manager().perform(Request::getInstance(named("Sample_Recursive", std::to_string(depth).c_str())));
         const std::string expected = std::to_string(depth) + ">Below=" + std::to_string(depth - 1);
-        EXPECT_EQ(textOf(nested.instance().properties, "Below").value_or("").substr(0, expected.size()), expected);
+        EXPECT_EQ(stringOf(nested.instance().properties, "Below").value_or("").substr(0, expected.size()), expected);
         const auto other = manager().perform(Request::enumerateInstances(classPath("Sample_CallsOther_Thing")));
         ASSERT_EQ(other.instances.size(), 1U) << other.status.message;
         EXPECT_EQ(other.instance().path.className, "Other_Thing");
@@ -49,13 +49,13 @@ protected:
         const auto far =
             manager().perform(Request::associators(named("Sample_Thing", "x"), {"Sample_Link", {}, role, {}}));
         ASSERT_EQ(far.instances.size(), 1U) << far.status.message;
-        EXPECT_EQ(textOf(far.instance().properties, "Asked"), "Sample_Link,none," + role + ",none");
+        EXPECT_EQ(stringOf(far.instance().properties, "Asked"), "Sample_Link,none," + role + ",none");
     }
 
     std::atomic<int> logged{0};
 };
 
-TEST_P(ConcurrencyTest, EveryClientGetsItsOwnAnswers) {
+TEST_P(ConcurrencyTest, EachClientReceivesItsOwnResponses) {
     shared();
     std::vector<std::thread> threads;
     for (int client = 0; client < clients; ++client) {

@@ -15,7 +15,7 @@ class LoadingTest : public OperationsTest {
 protected:
     void ask(const char* className) { manager().perform(Request::enumerateInstances(classPath(className))); }
 
-    /** The text of the LibraryError that asking for a class ends with; empty when it does not. */
+    /** The message of the LibraryError of a request for a class; empty if there is none. */
     std::string errorOf(const char* className) {
         try {
             ask(className);
@@ -65,10 +65,10 @@ TEST_F(LoadingTest, AProviderThatWantsToStayStays) {
     EXPECT_TRUE(isLoaded("libOtherProvider.so"));
 }
 
-TEST_F(LoadingTest, TheGenericFactoryIsToldTheName) {
+TEST_F(LoadingTest, TheGenericFactoryReceivesTheName) {
     const auto found = manager().perform(Request::enumerateInstances(classPath("Other_Thing")));
     ASSERT_EQ(found.instances.size(), 1U);
-    EXPECT_EQ(testsupport::textOf(found.instance().properties, "Provider"), "Anything");
+    EXPECT_EQ(testsupport::stringOf(found.instance().properties, "Provider"), "Anything");
 }
 
 TEST_F(LoadingTest, AMissingFunctionIsNotSupported) {
@@ -77,7 +77,8 @@ TEST_F(LoadingTest, AMissingFunctionIsNotSupported) {
 }
 
 TEST_F(LoadingTest, AMissingLibraryIsALibraryError) {
-    EXPECT_EQ(errorOf("Unloadable"), "libDoesNotExist.so is in none of these folders: /nonexistent, " TEST_PROVIDERS);
+    EXPECT_EQ(errorOf("Unloadable"),
+              "libDoesNotExist.so is in none of these directories: /nonexistent, " TEST_PROVIDERS);
 }
 
 TEST_F(LoadingTest, AFileThatIsNoLibraryIsALibraryError) {
@@ -100,7 +101,7 @@ TEST_F(LoadingTest, AFailingFactoryIsALibraryError) {
     EXPECT_THAT(errorOf("Refusing_Thing"), testing::HasSubstr("no licence"));
     EXPECT_THAT(errorOf("Null_Thing"), testing::HasSubstr("no interface"));
     EXPECT_THAT(errorOf("Throwing_Thing"), testing::HasSubstr("no luck"));
-    EXPECT_THAT(errorOf("Selfish_Thing"), testing::HasSubstr("needs itself"));
+    EXPECT_THAT(errorOf("Selfish_Thing"), testing::HasSubstr("sent a request to itself"));
 }
 
 TEST_F(LoadingTest, AFailedFactoryIsTriedAgain) {
@@ -131,7 +132,7 @@ TEST_F(LoadingTest, ALaterRegistrationReplacesAnEarlierOne) {
     EXPECT_EQ(found.instance().path.className, "Other_Thing");
 }
 
-TEST_F(LoadingTest, AnInterfaceRefusesOperationsOfTheOtherKind) {
+TEST_F(LoadingTest, AnInterfaceRejectsOperationsOfTheOtherKind) {
     cimhost::Request request;
     request.operation = cimhost::Operation::associators;
     CMPIInstanceMI none{};

@@ -5,8 +5,8 @@ namespace {
 using cimhost::Instance;
 using cimhost::ObjectPath;
 using cimhost::Request;
+using testsupport::stringOf;
 using testsupport::text;
-using testsupport::textOf;
 
 class ObjectManagerTest : public OperationsTest {
 protected:
@@ -21,9 +21,9 @@ TEST_F(ObjectManagerTest, CreatesFindsAndDeletes) {
     EXPECT_EQ(testsupport::toText(created.path()), "root/cimv2:Sample_Thing.Name=\"a\"");
     const auto names = manager().perform(Request::enumerateInstanceNames(classPath("Sample_Thing")));
     ASSERT_EQ(names.paths.size(), 1U);
-    EXPECT_EQ(textOf(names.path().keys, "Name"), "a");
+    EXPECT_EQ(stringOf(names.path().keys, "Name"), "a");
     const auto found = manager().perform(Request::getInstance(created.path()));
-    EXPECT_EQ(textOf(found.instance().properties, "Name"), "a");
+    EXPECT_EQ(stringOf(found.instance().properties, "Name"), "a");
     EXPECT_TRUE(manager().perform(Request::deleteInstance(created.path())).ok());
     EXPECT_TRUE(manager().perform(Request::enumerateInstances(classPath("Sample_Thing"))).instances.empty());
 }
@@ -51,7 +51,7 @@ TEST_F(ObjectManagerTest, CreateHandsOverKeysThenProperties) {
     given.properties = {testsupport::named("Colour", text("red"))};
     ASSERT_TRUE(manager().perform(Request::createInstance(named("Sample_Thing", "d"), given)).ok());
     const auto found = manager().perform(Request::getInstance(named("Sample_Thing", "d")));
-    EXPECT_EQ(textOf(found.instance().properties, "Text"), "Name=d;Colour=red;");
+    EXPECT_EQ(stringOf(found.instance().properties, "Text"), "Name=d;Colour=red;");
 }
 
 TEST_F(ObjectManagerTest, CreateHandsOverNoKeyTwice) {
@@ -59,7 +59,7 @@ TEST_F(ObjectManagerTest, CreateHandsOverNoKeyTwice) {
     given.properties = {testsupport::named("Colour", text("red")), testsupport::named("NAME", text("e"))};
     ASSERT_TRUE(manager().perform(Request::createInstance(named("Sample_Thing", "e"), given)).ok());
     const auto found = manager().perform(Request::getInstance(named("Sample_Thing", "e")));
-    EXPECT_EQ(textOf(found.instance().properties, "Text"), "Colour=red;NAME=e;");
+    EXPECT_EQ(stringOf(found.instance().properties, "Text"), "Colour=red;NAME=e;");
 }
 
 TEST_F(ObjectManagerTest, ModifyHandsOverExactlyTheProperties) {
@@ -68,16 +68,16 @@ TEST_F(ObjectManagerTest, ModifyHandsOverExactlyTheProperties) {
     given.properties = {testsupport::named("Colour", text("blue"))};
     ASSERT_TRUE(manager().perform(Request::modifyInstance(named("Sample_Thing", "f"), given)).ok());
     const auto found = manager().perform(Request::getInstance(named("Sample_Thing", "f")));
-    EXPECT_EQ(textOf(found.instance().properties, "Text"), "Colour=blue;");
+    EXPECT_EQ(stringOf(found.instance().properties, "Text"), "Colour=blue;");
 }
 
-TEST_F(ObjectManagerTest, AFailureWithoutAMessageGetsOne) {
+TEST_F(ObjectManagerTest, AFailureWithoutAMessageReceivesOne) {
     const auto status = manager().perform(Request::deleteInstance(named("Sample_Thing", "missing"))).status;
     EXPECT_EQ(status.rc, CMPI_RC_ERR_NOT_FOUND);
     EXPECT_FALSE(status.message.empty());
 }
 
-TEST_F(ObjectManagerTest, AFailureKeepsItsMessageAndGivesNoResults) {
+TEST_F(ObjectManagerTest, AFailureHasItsMessageAndNoResults) {
     const auto found = manager().perform(Request::enumerateInstances(classPath("Sample_Failing")));
     EXPECT_EQ(found.status.rc, CMPI_RC_ERR_ACCESS_DENIED);
     EXPECT_EQ(found.status.message, "not for you");
@@ -111,27 +111,27 @@ TEST_F(ObjectManagerTest, ResultsOfTheWrongKindAreAFailure) {
     EXPECT_THAT(names.status.message, testing::HasSubstr("EnumerateInstanceNames"));
 }
 
-TEST_F(ObjectManagerTest, APropertyListGoesToTheProvider) {
+TEST_F(ObjectManagerTest, APropertyListReachesTheProvider) {
     create("Sample_Thing", "g");
     const auto found = manager().perform(
         Request::enumerateInstances(classPath("Sample_Thing"), std::vector<std::string>{"Wanted", "Also"}));
     ASSERT_EQ(found.instances.size(), 1U);
-    EXPECT_EQ(textOf(found.instance().properties, "Text"), "Wanted");
+    EXPECT_EQ(stringOf(found.instance().properties, "Text"), "Wanted");
 }
 
 TEST_F(ObjectManagerTest, CompletesTheContext) {
     const auto plain = manager().perform(Request::enumerateInstances(classPath("Sample_Context")));
-    EXPECT_EQ(textOf(plain.instance().properties, "Name"), "root/cimv2;;0");
+    EXPECT_EQ(stringOf(plain.instance().properties, "Name"), "root/cimv2;;0");
     const cimhost::ContextEntries given{testsupport::named("cmpiPrincipal", text("anna")),
                                         testsupport::named(CMPIInvocationFlags, testsupport::uint32(4))};
     const auto own = manager().perform(Request::enumerateInstances(classPath("Sample_Context")).with(given));
-    EXPECT_EQ(textOf(own.instance().properties, "Name"), "root/cimv2;anna;4");
+    EXPECT_EQ(stringOf(own.instance().properties, "Name"), "root/cimv2;anna;4");
 }
 
-TEST_F(ObjectManagerTest, OptionsGiveEveryRequestContextEntries) {
+TEST_F(ObjectManagerTest, OptionsAddContextEntriesToEachRequest) {
     options.context = {testsupport::named(CMPIPrincipal, text("daemon"))};
     const auto found = manager().perform(Request::enumerateInstances(classPath("Sample_Context")));
-    EXPECT_EQ(textOf(found.instance().properties, "Name"), "root/cimv2;daemon;0");
+    EXPECT_EQ(stringOf(found.instance().properties, "Name"), "root/cimv2;daemon;0");
 }
 
 TEST_F(ObjectManagerTest, AnExceptionOfAProviderIsAFailure) {
@@ -143,7 +143,7 @@ TEST_F(ObjectManagerTest, AnExceptionOfAProviderIsAFailure) {
     EXPECT_TRUE(manager().perform(Request::enumerateInstances(classPath("Sample_Thing"))).ok()) << "life goes on";
 }
 
-TEST_F(ObjectManagerTest, TheResponseHasEverythingThatTheProviderDid) {
+TEST_F(ObjectManagerTest, TheResponseHasTheProvidersResponse) {
     cimhost::Request request;
     request.path = classPath("Sample_Failing");
     auto failing = manager().perform(request);
@@ -167,7 +167,7 @@ TEST_F(ObjectManagerTest, AnUpCallReachesTheSameLibrary) {
     create("Sample_Thing", "h");
     const auto found = manager().perform(Request::enumerateInstances(classPath("Sample_CallsSample_Thing")));
     ASSERT_EQ(found.instances.size(), 1U) << found.status.message;
-    EXPECT_EQ(textOf(found.instance().properties, "Name"), "h");
+    EXPECT_EQ(stringOf(found.instance().properties, "Name"), "h");
 }
 
 TEST_F(ObjectManagerTest, AnUpCallReachesAnotherLibrary) {
@@ -179,10 +179,10 @@ TEST_F(ObjectManagerTest, AnUpCallReachesAnotherLibrary) {
 TEST_F(ObjectManagerTest, UpCallsNest) {
     const auto found = manager().perform(Request::getInstance(named("Sample_Recursive", "3")));
     ASSERT_TRUE(found.ok()) << found.status.message;
-    EXPECT_EQ(textOf(found.instance().properties, "Below"), "3>Below=2>Below=1>Below=0>bottom;;;");
+    EXPECT_EQ(stringOf(found.instance().properties, "Below"), "3>Below=2>Below=1>Below=0>bottom;;;");
 }
 
-TEST_F(ObjectManagerTest, AFailingUpCallTellsTheCaller) {
+TEST_F(ObjectManagerTest, AFailingUpCallReturnsItsStatus) {
     const auto missing = manager().perform(Request::enumerateInstances(classPath("Sample_CallsMissing")));
     EXPECT_EQ(missing.status.rc, CMPI_RC_ERR_INVALID_CLASS);
     EXPECT_THAT(missing.status.message, testing::HasSubstr("Missing"));
@@ -200,17 +200,17 @@ TEST_F(ObjectManagerTest, AssociationsGoByTheirClass) {
     const cimhost::AssociationFilter filter{"sample_link", "Far", "Here", std::nullopt};
     const auto found = manager().perform(Request::associators(named("Sample_Thing", "x"), filter));
     ASSERT_EQ(found.instances.size(), 1U) << found.status.message;
-    EXPECT_EQ(textOf(found.instance().properties, "Asked"), "sample_link,Far,Here,none");
+    EXPECT_EQ(stringOf(found.instance().properties, "Asked"), "sample_link,Far,Here,none");
 }
 
-TEST_F(ObjectManagerTest, WithoutAClassAllAssociationsAreAsked) {
+TEST_F(ObjectManagerTest, WithoutAClassAllAssociationsAreCalled) {
     const auto found = manager().perform(Request::associatorNames(named("Sample_Thing", "x"), {}));
     ASSERT_EQ(found.paths.size(), 2U);
-    EXPECT_EQ(textOf(found.paths[0].keys, "Asked"), "Sample_Link");
-    EXPECT_EQ(textOf(found.paths[1].keys, "Asked"), "Sample_OtherLink");
+    EXPECT_EQ(stringOf(found.paths[0].keys, "Asked"), "Sample_Link");
+    EXPECT_EQ(stringOf(found.paths[1].keys, "Asked"), "Sample_OtherLink");
 }
 
-TEST_F(ObjectManagerTest, ASuperclassStandsForItsAssociations) {
+TEST_F(ObjectManagerTest, ASuperclassMeansItsAssociations) {
     auto shape = std::make_shared<cimhost::ClassInfo>();
     shape->name = "Sample_OtherLink";
     shape->superclasses = {"Sample_AnyLink"};
@@ -220,7 +220,7 @@ TEST_F(ObjectManagerTest, ASuperclassStandsForItsAssociations) {
     const auto found =
         manager().perform(Request::associatorNames(named("Sample_Thing", "x"), {"Sample_AnyLink", {}, {}, {}}));
     ASSERT_EQ(found.paths.size(), 1U);
-    EXPECT_EQ(textOf(found.paths[0].keys, "Asked"), "Sample_OtherLink");
+    EXPECT_EQ(stringOf(found.paths[0].keys, "Asked"), "Sample_OtherLink");
 }
 
 TEST_F(ObjectManagerTest, AnUnknownAssociationIsInvalid) {

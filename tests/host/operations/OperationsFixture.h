@@ -39,13 +39,13 @@ protected:
         registry.add(registration);
     }
 
-    /** Starts the manager at the first need, with all that was added until then. */
+    /** The first call creates the manager, with the classes added until then. */
     cimhost::ObjectManager& manager() {
         if (!started) {
             options.libraries.searchPath = {"/nonexistent", TEST_PROVIDERS};
             options.log = [this](const cimhost::LogRecord& record) {
-                log.push_back(record.text);
-                if (record.text == awaited) {
+                log.push_back(record.message);
+                if (record.message == awaited) {
                     awaited.clear();
                     whenLogged();
                 }
@@ -63,8 +63,8 @@ protected:
         return testsupport::objectPath("root/cimv2", className, {testsupport::named("Name", testsupport::text(name))});
     }
 
-    std::string awaited;               ///< at which text whenLogged is called, once
-    std::function<void()> whenLogged;  ///< inside of the provider's call
+    std::string awaited;               ///< the message at which whenLogged is called, once
+    std::function<void()> whenLogged;  ///< called inside the provider's call
 
     std::vector<std::string> log;  ///< what providers logged; outlives the manager, whose end is logged too
     cimhost::ObjectManagerOptions options;

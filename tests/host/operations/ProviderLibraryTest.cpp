@@ -13,8 +13,8 @@ using testsupport::objectPath;
 using testsupport::Outcome;
 using testsupport::ProviderLibrary;
 using testsupport::RecordingBroker;
+using testsupport::stringOf;
 using testsupport::text;
-using testsupport::textOf;
 
 class ProviderLibraryTest : public testing::Test {
 protected:
@@ -48,7 +48,7 @@ TEST_F(ProviderLibraryTest, RunsEveryInstanceOperation) {
     EXPECT_EQ(found.rc, CMPI_RC_OK);
     EXPECT_FALSE(found.hasMessage);
     EXPECT_EQ(found.doneCount, 1);
-    EXPECT_EQ(textOf(found.instances().front().properties, "Name"), "a");
+    EXPECT_EQ(stringOf(found.instances().front().properties, "Name"), "a");
     EXPECT_EQ(provider.modifyInstance(thing("a"), testsupport::instance(thing("a"))).rc, CMPI_RC_OK);
     EXPECT_EQ(provider.deleteInstance(thing("a")).rc, CMPI_RC_OK);
     EXPECT_EQ(provider.cleanupInstanceMI(true).rc, CMPI_RC_OK);
@@ -56,7 +56,7 @@ TEST_F(ProviderLibraryTest, RunsEveryInstanceOperation) {
 
 TEST_F(ProviderLibraryTest, RunsEveryAssociationOperation) {
     const cimhost::AssociationFilter filter{"Sample_Link", {}, {}, "Role"};
-    EXPECT_EQ(textOf(provider.associators(thing("a"), filter).instances().front().properties, "Asked"),
+    EXPECT_EQ(stringOf(provider.associators(thing("a"), filter).instances().front().properties, "Asked"),
               "Sample_Link,none,none,Role");
     EXPECT_EQ(provider.associatorNames(thing("a"), filter).paths().size(), 1U);
     EXPECT_EQ(provider.references(thing("a"), {{}, "Sample_Link", {}, {}}).instances().size(), 1U);
@@ -64,7 +64,7 @@ TEST_F(ProviderLibraryTest, RunsEveryAssociationOperation) {
     EXPECT_EQ(provider.cleanupAssociationMI(false).rc, CMPI_RC_OK);
 }
 
-TEST_F(ProviderLibraryTest, TellsMessagesAndExceptions) {
+TEST_F(ProviderLibraryTest, ReportsMessagesAndExceptions) {
     const Outcome failing = provider.enumerateInstances(objectPath("root/cimv2", "Sample_Failing"));
     EXPECT_EQ(failing.rc, CMPI_RC_ERR_ACCESS_DENIED);
     EXPECT_TRUE(failing.hasMessage);
@@ -93,7 +93,7 @@ TEST_F(ProviderLibraryTest, ProviderMeetsServedInstances) {
 TEST_F(ProviderLibraryTest, HasAContext) {
     const auto context = [&] {
         const Outcome found = provider.enumerateInstances(objectPath("root/cimv2", "Sample_Context"));
-        return textOf(found.instances().front().properties, "Name");
+        return stringOf(found.instances().front().properties, "Name");
     };
     EXPECT_EQ(context(), ";tester;0");
     provider.setContext({named(CMPIInitNameSpace, text("root/x"))});
@@ -109,7 +109,7 @@ TEST_F(ProviderLibraryTest, RunsAnyCall) {
     EXPECT_EQ(outcome.rc, CMPI_RC_ERR_NOT_FOUND);
 }
 
-TEST_F(ProviderLibraryTest, TellsWhatCannotBeLoaded) {
+TEST_F(ProviderLibraryTest, ReportsMissingLibrariesAndFactories) {
     EXPECT_THROW(ProviderLibrary("/nonexistent/libNone.so", "None", broker), cimhost::LibraryError);
     ProviderLibrary wrong(TEST_PROVIDERS "/libSampleProvider.so", "Wrong", broker);
     EXPECT_THROW(wrong.instanceMI(), cimhost::LibraryError);

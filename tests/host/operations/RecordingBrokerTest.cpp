@@ -69,7 +69,7 @@ TEST_F(RecordingBrokerTest, ForgetsCalls) {
     EXPECT_EQ(recorder.count("CMPIBrokerEncFT.newObjectPath"), 0);
 }
 
-TEST_F(RecordingBrokerTest, FailsTheCallThatItIsTold) {
+TEST_F(RecordingBrokerTest, FailsTheChosenCall) {
     newPath();
     recorder.failCall("CMPIBrokerEncFT.newObjectPath", 2, CMPI_RC_ERR_FAILED);
     EXPECT_NE(newPath(), nullptr);
@@ -87,7 +87,7 @@ TEST_F(RecordingBrokerTest, FailsEveryCallUntilItObeys) {
     EXPECT_EQ(result->ft->returnDone(result).rc, CMPI_RC_ERR_INVALID_HANDLE);
     EXPECT_EQ(result->ft->returnDone(result).rc, CMPI_RC_ERR_INVALID_HANDLE);
     EXPECT_TRUE(events.empty());
-    recorder.obey();
+    recorder.cancelFailures();
     EXPECT_EQ(result->ft->returnDone(result).rc, CMPI_RC_OK);
 }
 
@@ -119,7 +119,7 @@ TEST_F(RecordingBrokerTest, MakesStringsWithoutCharacters) {
     EXPECT_STREQ(some->ft->getCharPtr(some, &status), "some");
 }
 
-TEST_F(RecordingBrokerTest, AnswersAKeyAsTold) {
+TEST_F(RecordingBrokerTest, ReturnsTheInjectedKey) {
     CMPIData data{};
     data.type = CMPI_uint64;
     data.state = CMPI_keyValue;
@@ -161,7 +161,7 @@ TEST_F(RecordingBrokerTest, ReturnsEachStateThatIsOrderedInEachPlace) {
         EXPECT_NE(element.value.inst, nullptr);
         EXPECT_EQ(status.rc, CMPI_RC_OK);
     }
-    recorder.obey();
+    recorder.cancelFailures();
     EXPECT_EQ(path->ft->getKeyAt(path, 0, nullptr, &status).state, CMPI_keyValue);
 }
 
@@ -175,7 +175,7 @@ TEST_F(RecordingBrokerTest, ShowsTheNullPointersThatAProviderReturns) {
     EXPECT_TRUE(std::holds_alternative<cimhost::NullResult>(events.back()));
 }
 
-TEST_F(RecordingBrokerTest, RefusesNamesOfNoFunction) {
+TEST_F(RecordingBrokerTest, RejectsUnknownFunctionNames) {
     EXPECT_THROW(recorder.failEvery("CMPIStringFT.getChars", CMPI_RC_ERR_FAILED), std::invalid_argument);
     EXPECT_THROW(recorder.count("getCharPtr"), std::invalid_argument);
 }
@@ -224,7 +224,7 @@ TEST_F(RecordingBrokerTest, EmulatingRecordsNoCalls) {
     EXPECT_TRUE(recorder.calls().empty());
 }
 
-TEST_F(RecordingBrokerTest, KnowsTheClassesThatItIsTold) {
+TEST_F(RecordingBrokerTest, KnowsTheGivenClasses) {
     recorder.know([](const std::string& name) {
         return std::make_shared<cimhost::ClassInfo>(
             cimhost::ClassInfo{name, {{"Size", CMPI_uint32, false, false, {}}}, {}});

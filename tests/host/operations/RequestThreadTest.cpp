@@ -9,7 +9,7 @@
 
 namespace {
 
-TEST(RequestThread, AThreadBelongsToTheChainOfWhoStartedIt) {
+TEST(RequestThread, AThreadBelongsToTheChainOfItsStarter) {
     const cimhost::RequestChain mine = cimhost::requestChain();
     cimhost::RequestChain other = nullptr;
     cimhost::onNewThread([&] { other = cimhost::requestChain(); });
@@ -18,7 +18,7 @@ TEST(RequestThread, AThreadBelongsToTheChainOfWhoStartedIt) {
     EXPECT_NE(other, mine);
 }
 
-TEST(RequestThread, WhatIsThrownThereIsThrownHere) {
+TEST(RequestThread, AnExceptionIsRethrownByTheCaller) {
     EXPECT_THROW(cimhost::onNewThread([] { throw std::runtime_error("x"); }), std::runtime_error);
 }
 

@@ -12,7 +12,7 @@ using testing::StartsWith;
 struct BadMof {
     const char* name;
     const char* text;
-    const char* place;     ///< line:column
+    const char* position;  ///< line:column
     const char* expected;  ///< part of the message
 };
 
@@ -22,9 +22,9 @@ void PrintTo(const BadMof& bad, std::ostream* out) {
 
 class MofError : public testing::TestWithParam<BadMof> {};
 
-TEST_P(MofError, SaysWhereAndWhatWasExpected) {
+TEST_P(MofError, HasAPositionAndTheExpectation) {
     const std::string message = refusalOf(GetParam().text);
-    EXPECT_THAT(message, StartsWith("test.mof:" + std::string(GetParam().place) + ": "));
+    EXPECT_THAT(message, StartsWith("test.mof:" + std::string(GetParam().position) + ": "));
     EXPECT_THAT(message, HasSubstr(GetParam().expected));
 }
 
@@ -69,10 +69,10 @@ const BadMof syntax[] = {
 INSTANTIATE_TEST_SUITE_P(Syntax, MofError, testing::ValuesIn(syntax), nameOf);
 
 const BadMof meaning[] = {
-    {"UnknownType", "class C {\n    strnig A; };", "2:5", "strnig is no data type"},
+    {"UnknownType", "class C {\n    strnig A; };", "2:5", "strnig is not a data type"},
     {"UnknownQualifier", "class C { [Kye] string A; };", "1:12", "qualifier Kye is not declared"},
     {"QualifierTwice", "class C { [Key, key] string A; };", "1:17", "given twice"},
-    {"UnknownFlavor", "[Key : Sweet] class C {};", "1:8", "Sweet is no flavor"},
+    {"UnknownFlavor", "[Key : Sweet] class C {};", "1:8", "Sweet is not a flavor"},
     {"UnknownSuperclass", "class C : D {};", "1:1", "superclass D of class C is not declared"},
     {"ClassTwice", "class C {};\nclass c {};", "2:1", "class c is declared a second time"},
     {"PropertyTwice", "class C { string A; uint8 a; };", "1:1", "declares the property a twice"},
@@ -88,10 +88,10 @@ const BadMof meaning[] = {
     {"NoDateTime", "class C { datetime A = \"tomorrow\"; };", "1:24", "25 characters"},
     {"RealTooLarge", "class C { real32 A = 1.0e39; };", "1:22", "out of range"},
     {"RealBeyondDouble", "class C { real64 A = 1.0e999; };", "1:22", "out of range"},
-    {"HalfACharacter", "class C { string A = \"\\xD800\"; };", "1:22", "half a character"},
+    {"HalfACharacter", "class C { string A = \"\\xD800\"; };", "1:22", "surrogate"},
     {"NulCharacter", "class C { string A = \"\\x0\"; };", "1:22", "\\x0"},
     {"CharacterOf17Bits", "class C { char16 A = '\xF0\x9F\x98\x80'; };", "1:22", "16 bits"},
-    {"ListForOneValue", "class C { uint8 A = {1}; };", "1:21", "A is no array"},
+    {"ListForOneValue", "class C { uint8 A = {1}; };", "1:21", "A is not an array"},
     {"OneValueForList", "class C { uint8 A[] = 1; };", "1:23", "A is an array"},
     {"QualifierOfOtherType", "[Key(5)] class C {};", "1:6", "true or false"},
     {"QualifierDeclaredTwice", "Qualifier Q : string, Scope(any);\nQualifier q : string, Scope(any);", "2:1",
@@ -101,7 +101,7 @@ const BadMof meaning[] = {
     {"InstanceWithoutKey", "class C { [Key] string A; }; instance of C {};", "1:30", "the key A has no value"},
     {"InstanceWithNullKey", "class C { [Key] string A; }; instance of C { A = null; };", "1:30", "A has no value"},
     {"PropertyAssignedTwice", "class C { string A; }; instance of C { A = \"1\"; a = \"2\"; };", "1:49", "given twice"},
-    {"UnknownAlias", "class C { C REF A; }; instance of C { A = $B; };", "1:43", "$B is no alias"},
+    {"UnknownAlias", "class C { C REF A; }; instance of C { A = $B; };", "1:43", "$B is not an alias"},
     {"AliasForString", "class C { [Key] string A; }; instance of C as $X { A = \"\"; }; instance of C { A = $X; };",
      "1:83", "no reference"},
     {"MissingInclude", "class C {};\n#pragma include (\"missing.mof\")", "2:1",
@@ -147,9 +147,9 @@ TEST(MofFile, AnEmptyFileIsGood) {
     EXPECT_TRUE(schema.classes().empty());
 }
 
-TEST(MofText, ATextWithASyntaxErrorAddsNothing) {
+TEST(MofSource, ASourceWithASyntaxErrorAddsNothing) {
     Schema schema;
-    EXPECT_THROW(MofReader(schema).readText("class A {}; class {", "x"), LoadError);
+    EXPECT_THROW(MofReader(schema).readSource("class A {}; class {", "x"), LoadError);
     EXPECT_EQ(schema.findClass("A"), nullptr);
 }
 

@@ -44,7 +44,7 @@ TEST(MofInstance, AReferenceMustBeAPathToTheRightClass) {
     EXPECT_THAT(refusalOf(classes + std::string("instance of Beside { Left = \"Beside\"; };")),
                 testing::HasSubstr("must refer to a Shelf"));
     EXPECT_THAT(refusalOf(classes + std::string("instance of Beside { Left = 5; };")),
-                testing::HasSubstr("is no reference"));
+                testing::HasSubstr("is not a reference"));
 }
 
 }  // namespace

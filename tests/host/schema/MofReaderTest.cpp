@@ -10,7 +10,7 @@ Value defaultOf(const std::string& declaration) {
     return schema.findClass("C")->properties.at(0).defaultValue;
 }
 
-TEST(MofReader, AnEmptyTextAndOneOfCommentsGiveNothing) {
+TEST(MofReader, NothingAndCommentsDeclareNothing) {
     EXPECT_TRUE(schemaOf("").classes().empty());
     EXPECT_TRUE(schemaOf("// one\n/* two\n * lines */ // at the end").classes().empty());
     EXPECT_TRUE(schemaOf("\xEF\xBB\xBF// after a byte order mark").classes().empty());
@@ -87,7 +87,7 @@ TEST(MofReader, ReadsCharactersDateTimesAndNull) {
     EXPECT_EQ(element<Char16>(defaultOf(R"(char16 X = '\'';)")).code, u'\'');
     EXPECT_EQ(element<Char16>(defaultOf(R"(char16 X = '\xD83D';)")).code, 0xD83D);
     EXPECT_EQ(element<Char16>(defaultOf("char16 X = '\xE2\x82\xAC';")).code, 0x20AC);
-    EXPECT_EQ(element<DateTime>(defaultOf("datetime X = \"20260131120000.000000+060\";")).text,
+    EXPECT_EQ(element<DateTime>(defaultOf("datetime X = \"20260131120000.000000+060\";")).value,
               "20260131120000.000000+060");
     EXPECT_TRUE(defaultOf("uint8 X = null;").isNull);
 }

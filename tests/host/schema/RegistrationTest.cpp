@@ -92,13 +92,13 @@ TEST(RegistrationError, NamesFileAndLine) {
 }
 
 TEST(RegistrationError, AStanzaMustSayWhichProviderInWhichLibraryServesWhichNamespace) {
-    EXPECT_THAT(refusal("[One]\nlocation: L\nnamespace: n\n"), StartsWith("test.reg:1: the stanza [One] has no line"));
+    EXPECT_THAT(refusal("[One]\nlocation: L\nnamespace: n\n"), StartsWith("test.reg:1: the section [One] has no line"));
     EXPECT_THAT(refusal("[One]\nlocation: L\nnamespace: n\n"), HasSubstr("provider: NAME"));
     EXPECT_THAT(refusal("[One]\nprovider: P\nnamespace: n\n[Two]"), HasSubstr("location: LIBRARY"));
     EXPECT_THAT(refusal("[One]\nprovider: P\nlocation: L\n"), HasSubstr("namespace: root/cimv2"));
 }
 
-TEST(RegistrationFile, IsReadAndItsStanzasKnowWhereTheyStand) {
+TEST(RegistrationFile, IsReadWithThePositionOfEachSection) {
     const TemporaryDirectory directory;
     const auto file = directory.write("one.reg", "#\n[One]\nprovider: P\nlocation: L\nnamespace: n\n");
     const auto stanzas = readRegistrationFile(file);

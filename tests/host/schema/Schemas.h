@@ -13,18 +13,18 @@
 
 namespace cimhost::test {
 
-/** The schema that a MOF text gives. */
+/** The schema of a MOF source. */
 inline Schema schemaOf(const std::string& mof) {
     Schema schema;
-    MofReader(schema).readText(mof, "test.mof");
+    MofReader(schema).readSource(mof, "test.mof");
     return schema;
 }
 
-/** The message with which the reader refuses a MOF text; empty when it takes it. */
+/** The message of the reader's error; empty if there is none. */
 inline std::string refusalOf(const std::string& mof) {
     Schema schema;
     try {
-        MofReader(schema).readText(mof, "test.mof");
+        MofReader(schema).readSource(mof, "test.mof");
         return "";
     } catch (const LoadError& error) {
         return error.what();
@@ -36,13 +36,13 @@ inline std::string described(const Value& value) {
     return std::to_string(value.type) + (value.isArray ? "[] " : " ") + formatMof(value);
 }
 
-/** The single element of a value, as the C++ type that stands for its CIM type. */
+/** The single element of a value, as the C++ type of its CIM type. */
 template <typename Element>
 Element element(const Value& value) {
     return std::get<Element>(value.elements.at(0));
 }
 
-/** A directory of its own for a test, gone at the end. */
+/** A temporary directory, which the destructor removes. */
 class TemporaryDirectory {
 public:
     TemporaryDirectory() {

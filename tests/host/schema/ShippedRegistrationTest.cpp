@@ -12,7 +12,7 @@ using testing::ElementsAre;
 
 const std::filesystem::path directory = SCHEMA_DIRECTORY;
 
-/** The classes in which OpenPegasus keeps registrations, as far as they are filled. */
+/** The classes and properties of OpenPegasus's registrations. */
 constexpr auto pegasusClasses = R"(
     class PG_ProviderModule {
         [Key] string Name; string Vendor; string Version; string InterfaceType; string InterfaceVersion;
@@ -25,7 +25,7 @@ constexpr auto pegasusClasses = R"(
         string SupportedMethods[];
     };)";
 
-/** A provider's registration files, and what they are to say. */
+/** A provider's registration files, and their expected content. */
 struct Shipped {
     const char* provider;  ///< also the name of its library
     const char* sfcbFile;
@@ -47,11 +47,11 @@ protected:
         return schema;
     }
 
-    /** The instances of one of OpenPegasus's classes, in order, each as its properties in the form of MOF. */
+    /** The instances of a class of OpenPegasus, in order, each as its properties in MOF. */
     static std::vector<std::map<std::string, std::string>> instancesOf(const std::string& className) {
         Schema schema;
         MofReader reader(schema);
-        reader.readText(pegasusClasses, "pegasus");
+        reader.readSource(pegasusClasses, "pegasus");
         reader.readFile(directory / "pegasus" / (std::string(GetParam().provider) + ".mof"));
         std::vector<std::map<std::string, std::string>> found;
         for (const Instance& instance : schema.instances()) {
@@ -109,7 +109,7 @@ TEST_P(ShippedRegistration, NamesTheClassesToOpenPegasus) {
         EXPECT_EQ(each.at("ProviderModuleName"), quoted(GetParam().module));
         EXPECT_EQ(each.at("ProviderName"), quoted(GetParam().provider));
         EXPECT_EQ(each.at("Namespaces"), "{\"root/cimv2\"}");
-        // Enumerations of an association class would be empty with its second number alone.
+        // With its second number only, enumerations of an association class would be empty.
         EXPECT_EQ(each.at("ProviderType"), schema.findClass(name)->isAssociation() ? "{2, 3}" : "{2}") << name;
     }
     EXPECT_EQ(found, GetParam().classes);

@@ -13,7 +13,7 @@ using testing::UnorderedElementsAreArray;
 
 const std::filesystem::path directory = SCHEMA_DIRECTORY;
 
-/** Each property as "name type", with * for a key and + for one that clients may write. */
+/** Each property as "name type", with * for keys and + for properties that clients may modify. */
 std::vector<std::string> shape(const Class& known) {
     std::vector<std::string> rows;
     for (const Property& property : known.properties) {
@@ -59,7 +59,7 @@ TEST(ShippedSchema, SettingsReferToComputersAndToTheirElements) {
                 ElementsAre("Antecedent VELKO_ComputerSystem*", "Dependent VELKO_Warranty*"));
 }
 
-TEST(ShippedSchema, EveryClassFileStandsAloneInsideItsQualifiers) {
+TEST(ShippedSchema, EachClassFileIsCompleteWithTheQualifiers) {
     for (const std::string& name : classNames) {
         Schema schema;
         MofReader reader(schema);

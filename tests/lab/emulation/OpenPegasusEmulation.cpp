@@ -66,7 +66,7 @@ public:
         return isEmpty ? Status{} : ManagerBehaviour::statusOf(response, operation);
     }
 
-    Answer<ObjectPath> createdPath(const ProviderResponse& response) const override {
+    StatusOr<ObjectPath> createdPath(const ProviderResponse& response) const override {
         if (eventsOf<ObjectPath>(response.events).empty()) {
             return {{CMPI_RC_ERR_FAILED,
                      "The provider accepted CreateInstance, but returned no path: the client would have got a broken "

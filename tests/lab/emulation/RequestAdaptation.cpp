@@ -5,7 +5,7 @@
 #include <memory>
 
 #include "broker/NamedValues.h"
-#include "schema/Names.h"
+#include "cim/Names.h"
 
 namespace cimhost::lab {
 namespace {
@@ -84,7 +84,7 @@ void addCreationKeys(Request& request, const ClassInfo* known, const Value& unse
 void addNames(std::vector<std::string>& names, const ClassInfo& known, bool onlyKeys) {
     for (const PropertyInfo& property : known.properties) {
         const bool isListed = std::any_of(names.begin(), names.end(),
-                                          [&](const std::string& each) { return sameName(each, property.name); });
+                                          [&](const std::string& each) { return cim::sameName(each, property.name); });
         if (!isListed && (property.isKey || !onlyKeys)) {
             names.push_back(property.name);
         }

@@ -155,14 +155,14 @@ public:
     }
 
     /** An instance is misread as a path, with the namespace as its class. */
-    Answer<ObjectPath> createdPath(const ProviderResponse& response) const override {
+    StatusOr<ObjectPath> createdPath(const ProviderResponse& response) const override {
         const auto first = std::find_if(response.events.begin(), response.events.end(), [](const ResultEvent& each) {
             return std::holds_alternative<Instance>(each) || std::holds_alternative<ObjectPath>(each);
         });
         const auto* instance = first == response.events.end() ? nullptr : std::get_if<Instance>(&*first);
         return instance == nullptr
                    ? ManagerBehaviour::createdPath(response)
-                   : Answer<ObjectPath>{{}, {{}, instance->path.nameSpace, instance->path.nameSpace, {}}};
+                   : StatusOr<ObjectPath>{{}, {{}, instance->path.nameSpace, instance->path.nameSpace, {}}};
     }
 };
 

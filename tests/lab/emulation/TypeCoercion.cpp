@@ -5,9 +5,9 @@
 #include <optional>
 #include <type_traits>
 
+#include "cim/DateTime.h"
+#include "cim/Names.h"
 #include "lab/emulation/Emulations.h"
-#include "schema/Names.h"
-#include "schema/Text.h"
 
 namespace cimhost::lab {
 namespace {
@@ -82,7 +82,7 @@ Status convert(NamedValue& sent, const PropertyInfo& property) {
 bool hasInvalidDateTime(const Value& value) {
     return std::any_of(value.elements.begin(), value.elements.end(), [](const Scalar& each) {
         const auto* date = std::get_if<DateTime>(&each);
-        return date != nullptr && !isDateTime(date->text);
+        return date != nullptr && !cim::isDateTime(date->value);
     });
 }
 
@@ -106,8 +106,9 @@ Status checkEach(Request& request, const Broker& broker, Status (*check)(NamedVa
     const auto known = broker.classInfo(request.path.className);
     const auto& properties = known == nullptr ? std::vector<PropertyInfo>{} : known->properties;
     for (NamedValue& sent : request.instance.properties) {
-        const auto property = std::find_if(properties.begin(), properties.end(),
-                                           [&](const PropertyInfo& each) { return sameName(each.name, sent.name); });
+        const auto property = std::find_if(properties.begin(), properties.end(), [&](const PropertyInfo& each) {
+            return cim::sameName(each.name, sent.name);
+        });
         const Status status = property == properties.end() || sent.value.isNull ? Status{} : check(sent, *property);
         if (!status.ok()) {
             return status;

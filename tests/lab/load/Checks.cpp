@@ -3,21 +3,20 @@
 #include <algorithm>
 
 #include "broker/NamedValues.h"
+#include "cim/Names.h"
 #include "lab/load/Values.h"
 #include "operations/StatusText.h"
 #include "schema/MofWriter.h"
-#include "schema/Names.h"
 #include "schema/ObjectPathText.h"
-#include "schema/Text.h"
 
 namespace cimhost::lab {
 namespace {
 
-bool beginsWith(const std::string& text, const std::string& beginning) {
-    return text.compare(0, beginning.size(), beginning) == 0;
+bool beginsWith(const std::string& id, const std::string& prefix) {
+    return id.compare(0, prefix.size(), prefix) == 0;
 }
 
-std::string textOf(const Status& status) {
+std::string describe(const Status& status) {
     return status.ok() ? "OK" : errorText(status);
 }
 
@@ -26,8 +25,8 @@ std::optional<std::string> idOf(const LoadClass& known, const Instance& instance
     return inPath ? inPath : known.idIn(instance.properties);
 }
 
-/** One of many: at most one is wrong in it. */
-Verdict checkListed(const Expectation& expectation, const std::string& id, const Instance* instance) {
+/** Checks one instance of an enumeration. */
+CheckResult checkListed(const Expectation& expectation, const std::string& id, const Instance* instance) {
     const auto& known = expectation.state.instances();
     const auto found = known.find(id);
     if (found != known.end()) {
@@ -36,33 +35,34 @@ Verdict checkListed(const Expectation& expectation, const std::string& id, const
     if (beginsWith(id, expectation.own)) {
         return expectation.state.isDoubtful(id)
                    ? std::nullopt
-                   : Verdict(Mismatch{"deleted", "no instance " + id, "one that is not deleted"});
+                   : CheckResult(Mismatch{"deleted", "no instance " + id, "a deleted instance"});
     }
     const bool isAllowed = beginsWith(id, expectation.any) || expectation.others.count(id) != 0;
-    return isAllowed ? std::nullopt : Verdict(Mismatch{"unknown", "only instances that somebody made", inQuotes(id)});
+    return isAllowed ? std::nullopt
+                     : CheckResult(Mismatch{"unknown", "only instances that clients created", inQuotes(id)});
 }
 
 template <class Ids, class IdOf>
-Verdict checkNoneMissing(const Ids& ids, const std::set<std::string>& listed, IdOf idOf) {
+CheckResult checkNoneMissing(const Ids& ids, const std::set<std::string>& listed, IdOf idOf) {
     const auto missing =
         std::find_if(ids.begin(), ids.end(), [&](const auto& each) { return listed.count(idOf(each)) == 0; });
     return missing == ids.end() ? std::nullopt
-                                : Verdict(Mismatch{"missing", "instance " + idOf(*missing),
-                                                   "only " + std::to_string(listed.size()) + " others"});
+                                : CheckResult(Mismatch{"missing", "instance " + idOf(*missing),
+                                                       "only " + std::to_string(listed.size()) + " others"});
 }
 
 }  // namespace
 
-Verdict checkStatus(const Status& status, int code) {
+CheckResult checkStatus(const Status& status, int code) {
     if (status.rc == code) {
         return std::nullopt;
     }
-    return Mismatch{"status", code == CMPI_RC_OK ? "OK" : codeName(code), textOf(status)};
+    return Mismatch{"status", code == CMPI_RC_OK ? "OK" : codeName(code), describe(status)};
 }
 
-Verdict checkPath(const ObjectPath& created, const ObjectPath& expected) {
-    const bool isSame = sameName(created.className, expected.className) && created.keys.size() == 1 &&
-                        sameName(created.keys.front().name, expected.keys.front().name) &&
+CheckResult checkPath(const ObjectPath& created, const ObjectPath& expected) {
+    const bool isSame = cim::sameName(created.className, expected.className) && created.keys.size() == 1 &&
+                        cim::sameName(created.keys.front().name, expected.keys.front().name) &&
                         sameValue(created.keys.front().value, expected.keys.front().value);
     if (isSame) {
         return std::nullopt;
@@ -70,8 +70,8 @@ Verdict checkPath(const ObjectPath& created, const ObjectPath& expected) {
     return Mismatch{"path", formatObjectPath(expected), formatObjectPath(created)};
 }
 
-Verdict checkInstance(const LoadClass& known, const Instance& instance, const std::string& id,
-                      const ExpectedState::Values& values) {
+CheckResult checkInstance(const LoadClass& known, const Instance& instance, const std::string& id,
+                          const ExpectedState::Values& values) {
     const std::optional<std::string> inPath = known.idIn(instance.path.keys);
     const std::optional<std::string> inProperties = known.idIn(instance.properties);
     if (inPath.value_or(id) != id || inProperties.value_or(id) != id || (!inPath && !inProperties)) {
@@ -87,7 +87,7 @@ Verdict checkInstance(const LoadClass& known, const Instance& instance, const st
     return std::nullopt;
 }
 
-Verdict checkListing(const Expectation& expectation, const std::vector<Instance>& instances, bool hasProperties) {
+CheckResult checkListing(const Expectation& expectation, const std::vector<Instance>& instances, bool hasProperties) {
     std::set<std::string> listed;
     for (const Instance& instance : instances) {
         const std::optional<std::string> id = idOf(expectation.known, instance);
@@ -97,23 +97,23 @@ Verdict checkListing(const Expectation& expectation, const std::vector<Instance>
         if (!listed.insert(*id).second) {
             return Mismatch{"duplicate", "instance " + *id + " once", "more than once"};
         }
-        Verdict verdict = checkListed(expectation, *id, hasProperties ? &instance : nullptr);
-        if (verdict) {
-            return verdict;
+        CheckResult mismatch = checkListed(expectation, *id, hasProperties ? &instance : nullptr);
+        if (mismatch) {
+            return mismatch;
         }
     }
-    Verdict verdict = checkNoneMissing(expectation.others, listed, [](const std::string& id) { return id; });
-    return verdict ? verdict : checkNoneMissing(expectation.state.instances(), listed, [](const auto& instance) {
+    CheckResult mismatch = checkNoneMissing(expectation.others, listed, [](const std::string& id) { return id; });
+    return mismatch ? mismatch : checkNoneMissing(expectation.state.instances(), listed, [](const auto& instance) {
         return instance.first;
     });
 }
 
-Verdict checkAssociated(const std::vector<std::string>& now, const std::vector<std::string>& before) {
+CheckResult checkAssociated(const std::vector<std::string>& now, const std::vector<std::string>& before) {
     const auto listed = [](const std::vector<std::string>& paths) {
         return paths.empty() ? "nothing"
                              : std::to_string(paths.size()) + ": " + paths.front() + (paths.size() > 1 ? "..." : "");
     };
-    return now == before ? std::nullopt : Verdict(Mismatch{"association", listed(before), listed(now)});
+    return now == before ? std::nullopt : CheckResult(Mismatch{"association", listed(before), listed(now)});
 }
 
 }  // namespace cimhost::lab

@@ -9,47 +9,47 @@
 #include "lab/load/LoadClass.h"
 #include "model/Status.h"
 
-// What is wrong with an answer: nothing, or the first thing that is.
+// Checks of responses. Each returns the first mismatch.
 
 namespace cimhost::lab {
 
-/** Why an answer is wrong. */
+/** The difference between a response and the expected one. */
 struct Mismatch {
-    std::string kind{};  ///< one word, see docs/cimhost.md
+    std::string kind{};  ///< one word, see tests/lab/README.md
     std::string expected{};
     std::string got{};
 };
 
-using Verdict = std::optional<Mismatch>;
+using CheckResult = std::optional<Mismatch>;  ///< none: the response is right
 
-/** "status" when the code is another one. @param code CMPI_RC_OK or the code of the failure that must be answered */
-Verdict checkStatus(const Status& status, int code);
+/** "status" if the code differs. @param code the expected one */
+CheckResult checkStatus(const Status& status, int code);
 
-/** "path" when that is not the path of the instance that was created. */
-Verdict checkPath(const ObjectPath& created, const ObjectPath& expected);
+/** "path" if this is not the path of the created instance. */
+CheckResult checkPath(const ObjectPath& created, const ObjectPath& expected);
 
-/** "value" when the instance is another one or has other values than those that are known. */
-Verdict checkInstance(const LoadClass& known, const Instance& instance, const std::string& id,
-                      const ExpectedState::Values& values);
+/** "value" if the instance has another identifier, or other values than the expected ones. */
+CheckResult checkInstance(const LoadClass& known, const Instance& instance, const std::string& id,
+                          const ExpectedState::Values& values);
 
-/** What may and what must be in an enumeration. */
+/** The instances that an enumeration must or may contain. */
 struct Expectation {
     const LoadClass& known;
-    const std::set<std::string>& others;  ///< identifiers that are there whatever the load does
-    const ExpectedState& state;           ///< the instances that are known
-    std::string own{};                    ///< what identifiers begin with that only the state tells of
-    std::string any{};                    ///< what all identifiers of the load begin with
+    const std::set<std::string>& others;  ///< identifiers of instances that are not the load's
+    const ExpectedState& state;           ///< the load's instances
+    std::string own{};                    ///< prefix of identifiers of which the state knows all instances
+    std::string any{};                    ///< prefix of all identifiers of the load
 };
 
 /**
- * "missing" when an instance is not there, "duplicate" when it is there twice, "deleted" when it should not be there,
- * "unknown" when nobody ever made it, "nameless" when it has no identifier, and "value" as above.
- * @param instances of an enumeration of paths, with the paths alone
- * @param hasProperties whether they have their properties, too
+ * "missing" if an instance is missing, "duplicate" if it is listed twice, "deleted" if it was deleted, "unknown" if no
+ * client created it, "nameless" if it has no identifier, and "value" as checkInstance().
+ * @param instances of an enumeration of paths, instances without properties
+ * @param hasProperties whether they have properties
  */
-Verdict checkListing(const Expectation& expectation, const std::vector<Instance>& instances, bool hasProperties);
+CheckResult checkListing(const Expectation& expectation, const std::vector<Instance>& instances, bool hasProperties);
 
-/** "association" when other paths are associated than before. Both are sorted. */
-Verdict checkAssociated(const std::vector<std::string>& now, const std::vector<std::string>& before);
+/** "association" if the paths differ. Both lists are sorted. */
+CheckResult checkAssociated(const std::vector<std::string>& now, const std::vector<std::string>& before);
 
 }  // namespace cimhost::lab

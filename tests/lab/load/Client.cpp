@@ -15,44 +15,44 @@ ExpectedState::Values byName(const std::vector<NamedValue>& values) {
     return map;
 }
 
-/** Whether it is done to an instance that is there. */
+/** Whether a request of this kind is about an existing instance. */
 bool needsInstance(OperationKind kind) {
     return kind == OperationKind::modify || kind == OperationKind::remove || kind == OperationKind::get;
 }
 
 }  // namespace
 
-Client::Client(ObjectManager& itsManager, const Plan& itsPlan, const Baseline& itsBaseline, unsigned itsNumber)
+Client::Client(ObjectManager& itsManager, const Plan& itsPlan, const InitialState& itsInitial, unsigned itsNumber)
     : manager(itsManager),
       plan(itsPlan),
-      baseline(itsBaseline),
+      initial(itsInitial),
       number(itsNumber),
-      prefix(baseline.prefix + "c" + std::to_string(number) + "-"),
+      prefix(initial.prefix + "c" + std::to_string(number) + "-"),
       random(plan.seed, number),
       found(plan.shown),
       known(plan.classes.size()) {}
 
 void Client::run(std::size_t requests) {
     for (std::size_t i = 0; i < requests; ++i) {
-        take();
+        sendOne();
     }
 }
 
-void Client::take() {
-    turn = {random.below(plan.classes.size()), plan.mix.pick(random), {}, {}};
-    if (needsInstance(turn.kind) && state().isEmpty() && !plan.probes) {
-        turn.kind = OperationKind::create;
+void Client::sendOne() {
+    current = {random.below(plan.classes.size()), plan.mix.pick(random), {}, {}};
+    if (needsInstance(current.kind) && state().isEmpty() && !plan.probes) {
+        current.kind = OperationKind::create;
     }
-    ++asked;
-    Verdict verdict = act();
-    found.count(turn.kind, turn.time, verdict.has_value());
-    if (verdict) {
-        found.note({number, asked, turn.request, std::move(*verdict)});
+    ++requestCount;
+    CheckResult mismatch = send();
+    found.count(current.kind, current.time, mismatch.has_value());
+    if (mismatch) {
+        found.note({number, requestCount, current.description, std::move(*mismatch)});
     }
 }
 
-Verdict Client::act() {
-    switch (turn.kind) {
+CheckResult Client::send() {
+    switch (current.kind) {
         case OperationKind::create:
             return create();
         case OperationKind::modify:
@@ -68,114 +68,114 @@ Verdict Client::act() {
     }
 }
 
-Response Client::ask(const Request& request) {
-    turn.request = std::string(nameOf(request.operation)) + " " + formatObjectPath(request.path);
+Response Client::perform(const Request& request) {
+    current.description = std::string(nameOf(request.operation)) + " " + formatObjectPath(request.path);
     const auto start = std::chrono::steady_clock::now();
     Response response = manager.perform(request);
-    turn.time = std::chrono::steady_clock::now() - start;
+    current.time = std::chrono::steady_clock::now() - start;
     return response;
 }
 
-Verdict Client::judge(const Response& response, int code) {
+CheckResult Client::checkResponse(const Response& response, int code) {
     const std::string reason = response.crashReason();
-    return reason.empty() ? checkStatus(response.status, code) : Verdict(Mismatch{"died", "an answer", reason});
+    return reason.empty() ? checkStatus(response.status, code) : CheckResult(Mismatch{"died", "a response", reason});
 }
 
-Verdict Client::create() {
+CheckResult Client::create() {
     if (!state().isEmpty() && plan.probes && random.oneIn(16)) {
         return createAgain();
     }
     const std::string id = newId();
     const std::vector<NamedValue> values = plan.fills ? someValues() : std::vector<NamedValue>{};
     const Request request = createRequest(aClass(), id, values);
-    const Response response = ask(request);
-    Verdict verdict = judge(response, CMPI_RC_OK);
-    if (!verdict) {
-        verdict = checkPath(response.paths.front(), request.path);
+    const Response response = perform(request);
+    CheckResult mismatch = checkResponse(response, CMPI_RC_OK);
+    if (!mismatch) {
+        mismatch = checkPath(response.paths.front(), request.path);
     }
-    if (verdict) {
+    if (mismatch) {
         state().doubt(id);
     } else {
         state().created(id, byName(values));
     }
-    return verdict;
+    return mismatch;
 }
 
-Verdict Client::createAgain() {
+CheckResult Client::createAgain() {
     const std::string id = state().any(random);
-    Verdict verdict = judge(ask(createRequest(aClass(), id, {})), CMPI_RC_ERR_ALREADY_EXISTS);
-    if (verdict) {
+    CheckResult mismatch = checkResponse(perform(createRequest(aClass(), id, {})), CMPI_RC_ERR_ALREADY_EXISTS);
+    if (mismatch) {
         state().doubt(id);
     }
-    return verdict;
+    return mismatch;
 }
 
-Verdict Client::askForMissing(const Request& request) {
-    return judge(ask(request), CMPI_RC_ERR_NOT_FOUND);
+CheckResult Client::requestMissing(const Request& request) {
+    return checkResponse(perform(request), CMPI_RC_ERR_NOT_FOUND);
 }
 
-Verdict Client::modify() {
-    return probes() ? askForMissing(modifyRequest(aClass(), missingId(), someValues(), plan.listsChanges))
+CheckResult Client::modify() {
+    return probes() ? requestMissing(modifyRequest(aClass(), missingId(), someValues(), plan.listsChanges))
                     : modifyOwn(state().any(random));
 }
 
-Verdict Client::modifyOwn(const std::string& id) {
+CheckResult Client::modifyOwn(const std::string& id) {
     const std::vector<NamedValue> values = someValues();
-    Verdict verdict = judge(ask(modifyRequest(aClass(), id, values, plan.listsChanges)), CMPI_RC_OK);
-    if (verdict) {
+    CheckResult mismatch = checkResponse(perform(modifyRequest(aClass(), id, values, plan.listsChanges)), CMPI_RC_OK);
+    if (mismatch) {
         state().doubt(id);
     } else {
         state().modified(id, byName(values));
     }
-    return verdict;
+    return mismatch;
 }
 
-Verdict Client::remove() {
-    return probes() ? askForMissing(Request::deleteInstance(aClass().instancePath(missingId())))
+CheckResult Client::remove() {
+    return probes() ? requestMissing(Request::deleteInstance(aClass().instancePath(missingId())))
                     : removeOwn(state().any(random));
 }
 
-Verdict Client::removeOwn(const std::string& id) {
-    Verdict verdict = judge(ask(Request::deleteInstance(aClass().instancePath(id))), CMPI_RC_OK);
-    if (verdict) {
+CheckResult Client::removeOwn(const std::string& id) {
+    CheckResult mismatch = checkResponse(perform(Request::deleteInstance(aClass().instancePath(id))), CMPI_RC_OK);
+    if (mismatch) {
         state().doubt(id);
     } else {
         state().removed(id);
         lastRemoved = id;
     }
-    return verdict;
+    return mismatch;
 }
 
-Verdict Client::get() {
+CheckResult Client::get() {
     if (probes()) {
-        return askForMissing(Request::getInstance(aClass().instancePath(missingId())));
+        return requestMissing(Request::getInstance(aClass().instancePath(missingId())));
     }
     const std::string id = state().any(random);
-    const Response response = ask(Request::getInstance(aClass().instancePath(id)));
-    Verdict verdict = judge(response, CMPI_RC_OK);
-    return verdict ? verdict : checkInstance(aClass(), response.instances.front(), id, state().instances().at(id));
+    const Response response = perform(Request::getInstance(aClass().instancePath(id)));
+    CheckResult mismatch = checkResponse(response, CMPI_RC_OK);
+    return mismatch ? mismatch : checkInstance(aClass(), response.instances.front(), id, state().instances().at(id));
 }
 
-Verdict Client::enumerate() {
+CheckResult Client::enumerate() {
     const bool hasProperties = random.coin();
     const ObjectPath& path = aClass().path;
     const Response response =
-        ask(hasProperties ? Request::enumerateInstances(path) : Request::enumerateInstanceNames(path));
-    Verdict verdict = judge(response, CMPI_RC_OK);
-    const Expectation expectation{aClass(), baseline.ids[turn.index], state(), prefix, baseline.prefix};
-    return verdict ? verdict : checkListing(expectation, listed(response), hasProperties);
+        perform(hasProperties ? Request::enumerateInstances(path) : Request::enumerateInstanceNames(path));
+    CheckResult mismatch = checkResponse(response, CMPI_RC_OK);
+    const Expectation expectation{aClass(), initial.ids[current.index], state(), prefix, initial.prefix};
+    return mismatch ? mismatch : checkListing(expectation, listed(response), hasProperties);
 }
 
-Verdict Client::associate() {
+CheckResult Client::associate() {
     const std::size_t which = random.below(associationOperations.size());
-    const Associated& before = baseline.associated[which];
-    const Response response = ask(associationRequest(associationOperations[which], plan));
-    Verdict verdict = judge(response, before.code);
-    return verdict ? verdict : checkAssociated(associated(response, baseline.prefix), before.paths);
+    const Associated& before = initial.associated[which];
+    const Response response = perform(associationRequest(associationOperations[which], plan));
+    CheckResult mismatch = checkResponse(response, before.code);
+    return mismatch ? mismatch : checkAssociated(associated(response, initial.prefix), before.paths);
 }
 
 std::string Client::newId() {
-    return prefix + std::to_string(++made);
+    return prefix + std::to_string(++idCount);
 }
 
 std::string Client::missingId() {

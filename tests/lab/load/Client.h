@@ -2,75 +2,75 @@
 
 #include <vector>
 
-#include "lab/load/Baseline.h"
 #include "lab/load/ExpectedState.h"
+#include "lab/load/InitialState.h"
 #include "lab/load/Report.h"
 
 namespace cimhost::lab {
 
 /**
- * One of the clients: sends one request after the other about instances of its own, and knows what every answer must
- * be. Once in a while it asks for what is not there, and creates what is there already. The manager, the plan and the
- * baseline are shared and must outlive it.
+ * A client that sends requests about its own instances, one after the other, and knows the right response to each.
+ * Sometimes it requests an instance that does not exist, or creates one that exists. The manager, the plan and the
+ * initial state are shared and must outlive it.
  */
 class Client {
 public:
     /** @param itsNumber from 1 */
-    Client(ObjectManager& itsManager, const Plan& itsPlan, const Baseline& itsBaseline, unsigned itsNumber);
+    Client(ObjectManager& itsManager, const Plan& itsPlan, const InitialState& itsInitial, unsigned itsNumber);
 
     void run(std::size_t requests);
 
     const Statistics& statistics() const { return found; }
 
-    /** What it was told, by class of the plan. */
+    /** The expected state of its instances, by class of the plan. */
     const std::vector<ExpectedState>& states() const { return known; }
 
 private:
-    /** The request being made: which class it is about, what it turned out to be. */
-    struct Turn {
-        std::size_t index = 0;  ///< of the class
+    /** The current request. */
+    struct CurrentRequest {
+        std::size_t index = 0;  ///< of its class
         OperationKind kind = OperationKind::get;
-        std::string request{};
+        std::string description{};
         Statistics::Time time{};
     };
 
-    void take();
-    Verdict act();
-    Verdict create();
-    Verdict createAgain();
-    Verdict modify();
-    Verdict modifyOwn(const std::string& id);
-    Verdict remove();
-    Verdict removeOwn(const std::string& id);
-    Verdict get();
-    Verdict enumerate();
-    Verdict associate();
-    Verdict askForMissing(const Request& request);
+    void sendOne();
+    CheckResult send();
+    CheckResult create();
+    CheckResult createAgain();
+    CheckResult modify();
+    CheckResult modifyOwn(const std::string& id);
+    CheckResult remove();
+    CheckResult removeOwn(const std::string& id);
+    CheckResult get();
+    CheckResult enumerate();
+    CheckResult associate();
+    CheckResult requestMissing(const Request& request);
 
-    Response ask(const Request& request);
+    Response perform(const Request& request);
 
-    /** Checks the status of a response; "died" when the provider process would have ended. */
-    static Verdict judge(const Response& response, int code);
+    /** Checks the status of a response; "died" if it would have crashed the provider's process. */
+    static CheckResult checkResponse(const Response& response, int code);
 
-    const LoadClass& aClass() const { return plan.classes[turn.index]; }
-    ExpectedState& state() { return known[turn.index]; }
+    const LoadClass& aClass() const { return plan.classes[current.index]; }
+    ExpectedState& state() { return known[current.index]; }
     std::string newId();
-    std::string missingId();  ///< what it deleted last, or never makes; good for every class
+    std::string missingId();  ///< of the instance that it deleted last, or that it never creates
     bool probes() { return state().isEmpty() || (plan.probes && random.oneIn(16)); }
     std::vector<NamedValue> someValues();
 
     ObjectManager& manager;
     const Plan& plan;
-    const Baseline& baseline;
+    const InitialState& initial;
     unsigned number;
     std::string prefix;  ///< of its identifiers
     Random random;
     Statistics found;
     std::vector<ExpectedState> known;
-    std::size_t made = 0;  ///< identifiers, in all classes together
+    std::size_t idCount = 0;  ///< identifiers, of all classes
     std::string lastRemoved{};
-    std::size_t asked = 0;  ///< requests
-    Turn turn{};
+    std::size_t requestCount = 0;  ///< requests
+    CurrentRequest current{};
 };
 
 }  // namespace cimhost::lab

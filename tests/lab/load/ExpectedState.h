@@ -11,18 +11,18 @@
 
 namespace cimhost::lab {
 
-/** What somebody was told of the instances of a class that are its own. */
+/** The expected instances of a class, according to the responses to one client or to all. */
 class ExpectedState {
 public:
-    using Values = std::map<std::string, Value>;  ///< by property; what is not there is not known
+    using Values = std::map<std::string, Value>;  ///< by property; others are unknown
 
-    /** @name What answers said */
+    /** @name Changes according to responses */
     ///@{
     void created(const std::string& id, const Values& values);
     void modified(const std::string& id, const Values& values);
     void removed(const std::string& id);
 
-    /** An answer was wrong, or none: whether the instance is there, and with what, is not known any more. */
+    /** After a wrong response: the existence and the values of the instance are unknown. */
     void doubt(const std::string& id);
     ///@}
 
@@ -31,10 +31,10 @@ public:
     const std::set<std::string>& doubted() const { return doubtful; }
     bool isEmpty() const { return ids.empty(); }
 
-    /** One of the instances that are there. Not while it is empty. */
+    /** One of the instances. There must be one. */
     std::string any(Random& random) const { return random.oneOf(ids); }
 
-    /** Takes over what another state knows of other instances. */
+    /** Adds the instances of another state. */
     void add(const ExpectedState& other);
 
 private:

@@ -3,8 +3,8 @@
 #include <future>
 #include <memory>
 
-#include "lab/load/Baseline.h"
 #include "lab/load/Client.h"
+#include "lab/load/InitialState.h"
 #include "lab/load/Requests.h"
 #include "schema/ObjectPathText.h"
 
@@ -13,15 +13,15 @@ namespace {
 
 using Clients = std::vector<std::unique_ptr<Client>>;
 
-Clients makeClients(ObjectManager& manager, const Plan& plan, const Baseline& baseline) {
+Clients makeClients(ObjectManager& manager, const Plan& plan, const InitialState& initial) {
     Clients clients;
     for (unsigned number = 1; number <= plan.clients; ++number) {
-        clients.push_back(std::make_unique<Client>(manager, plan, baseline, number));
+        clients.push_back(std::make_unique<Client>(manager, plan, initial, number));
     }
     return clients;
 }
 
-/** Runs all clients at a time. @return the seconds that it took */
+/** Runs all clients concurrently. @return the time in seconds */
 double runClients(const Clients& clients, std::size_t requests) {
     std::promise<void> start;
     const std::shared_future<void> started = start.get_future().share();
@@ -41,7 +41,7 @@ double runClients(const Clients& clients, std::size_t requests) {
     return std::chrono::duration<double>(std::chrono::steady_clock::now() - begin).count();
 }
 
-/** What all clients together were told of a class. */
+/** The expected state of a class, of all clients. */
 ExpectedState stateOf(const Clients& clients, std::size_t index) {
     ExpectedState all;
     for (const auto& client : clients) {
@@ -50,24 +50,24 @@ ExpectedState stateOf(const Clients& clients, std::size_t index) {
     return all;
 }
 
-/** Looks at the end, alone, at what is there. */
+/** The checks at the end, when no client is running. */
 class Inspection {
 public:
-    Inspection(ObjectManager& itsManager, const Baseline& itsBaseline, Statistics& itsStatistics)
-        : manager(itsManager), baseline(itsBaseline), statistics(itsStatistics) {}
+    Inspection(ObjectManager& itsManager, const InitialState& itsInitial, Statistics& itsStatistics)
+        : manager(itsManager), initial(itsInitial), statistics(itsStatistics) {}
 
-    /** Whether a class holds what the state says. */
+    /** Checks the instances of a class. */
     void inspect(const LoadClass& known, const std::set<std::string>& others, const ExpectedState& state) {
         const Request request = Request::enumerateInstances(known.path);
         const Response response = manager.perform(request);
-        Verdict verdict = checkStatus(response.status, CMPI_RC_OK);
-        if (!verdict) {
-            verdict = checkListing({known, others, state, baseline.prefix, baseline.prefix}, response.instances, true);
+        CheckResult mismatch = checkStatus(response.status, CMPI_RC_OK);
+        if (!mismatch) {
+            mismatch = checkListing({known, others, state, initial.prefix, initial.prefix}, response.instances, true);
         }
-        note(request, std::move(verdict));
+        note(request, std::move(mismatch));
     }
 
-    /** Deletes what the state has, and what it may have. */
+    /** Deletes the instances of the state, also those that may exist. */
     void clear(const LoadClass& known, ExpectedState& state) {
         const std::map<std::string, ExpectedState::Values> instances = state.instances();
         for (const auto& [id, values] : instances) {
@@ -81,29 +81,30 @@ public:
     }
 
 private:
-    void note(const Request& request, Verdict verdict) {
+    void note(const Request& request, CheckResult mismatch) {
         ++number;
-        if (verdict) {
-            const std::string text = std::string(nameOf(request.operation)) + " " + formatObjectPath(request.path);
-            statistics.note({std::nullopt, number, text, std::move(*verdict)});
+        if (mismatch) {
+            const std::string description =
+                std::string(nameOf(request.operation)) + " " + formatObjectPath(request.path);
+            statistics.note({std::nullopt, number, description, std::move(*mismatch)});
         }
     }
 
     ObjectManager& manager;
-    const Baseline& baseline;
+    const InitialState& initial;
     Statistics& statistics;
     std::size_t number = 0;
 };
 
-void inspectAll(ObjectManager& manager, const Plan& plan, const Baseline& baseline, const Clients& clients,
+void inspectAll(ObjectManager& manager, const Plan& plan, const InitialState& initial, const Clients& clients,
                 Statistics& statistics) {
-    Inspection inspection(manager, baseline, statistics);
+    Inspection inspection(manager, initial, statistics);
     for (std::size_t i = 0; i < plan.classes.size(); ++i) {
         ExpectedState state = stateOf(clients, i);
-        inspection.inspect(plan.classes[i], baseline.ids[i], state);
+        inspection.inspect(plan.classes[i], initial.ids[i], state);
         if (!plan.keeps) {
             inspection.clear(plan.classes[i], state);
-            inspection.inspect(plan.classes[i], baseline.ids[i], state);
+            inspection.inspect(plan.classes[i], initial.ids[i], state);
         }
     }
 }
@@ -112,29 +113,29 @@ void inspectAll(ObjectManager& manager, const Plan& plan, const Baseline& baseli
 
 void requireFeasible(const Plan& plan) {
     if (plan.mix.weight(OperationKind::associate) > 0 && !plan.source) {
-        throw PlanError("there are associations in the mix, but no instance whose associations to ask for");
+        throw PlanError("the mix has associations, but there is no instance to start from; name it with --source");
     }
     for (const LoadClass& each : plan.classes) {
         if (plan.mix.weight(OperationKind::modify) > 0 && each.modifiable.empty()) {
-            throw PlanError("class " + each.path.className + " has no property with the qualifier Write that a load " +
-                            "has values for; leave modify out of the mix");
+            throw PlanError("class " + each.path.className +
+                            " has no property that a load can modify; omit modify from the mix");
         }
     }
 }
 
-Answer<Report> runLoad(ObjectManager& manager, const Plan& plan) {
+StatusOr<Report> runLoad(ObjectManager& manager, const Plan& plan) {
     requireFeasible(plan);
-    const Answer<Baseline> baseline = takeBaseline(manager, plan);
-    if (!baseline.ok()) {
-        return {baseline.status, {}};
+    const StatusOr<InitialState> initial = readInitialState(manager, plan);
+    if (!initial.ok()) {
+        return {initial.status, {}};
     }
-    const Clients clients = makeClients(manager, plan, baseline.value);
+    const Clients clients = makeClients(manager, plan, initial.value);
     const double seconds = runClients(clients, plan.requests);
     Statistics statistics(plan.shown);
     for (const auto& client : clients) {
         statistics.add(client->statistics());
     }
-    inspectAll(manager, plan, baseline.value, clients, statistics);
+    inspectAll(manager, plan, initial.value, clients, statistics);
     Report report = reportOf(statistics, seconds);
     report.clients = plan.clients;
     report.seed = plan.seed;

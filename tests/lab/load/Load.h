@@ -7,11 +7,11 @@
 namespace cimhost::lab {
 
 /**
- * Lets many clients, each on a thread of its own, send requests at a time, checks every answer, in the end also that
- * what is there is what the clients were told, and deletes it unless the plan keeps it.
- * @return a status other than OK when how things were before the load cannot be asked for
- * @throws PlanError when the plan is not feasible, LibraryError when a provider cannot be loaded
+ * Sends requests of many concurrent clients, one thread per client, and checks all responses. At the end, checks the
+ * instances against the expected state of all clients, and deletes them unless the plan keeps them.
+ * @return a status other than OK if the initial state cannot be read
+ * @throws PlanError if the plan is not possible, LibraryError if a provider cannot be loaded
  */
-Answer<Report> runLoad(ObjectManager& manager, const Plan& plan);
+StatusOr<Report> runLoad(ObjectManager& manager, const Plan& plan);
 
 }  // namespace cimhost::lab

@@ -9,21 +9,21 @@
 
 namespace cimhost::lab {
 
-/** What a load needs to know of a class; all of it comes from the schema, which must outlive it. */
+/** The facts of a class that a load uses. The schema must outlive it. */
 struct LoadClass {
     ObjectPath path{};                          ///< of the class
-    std::string key{};                          ///< the one key, a string
-    std::vector<const Property*> modifiable{};  ///< writable properties for which there are values
+    std::string key{};                          ///< the only key, a string
+    std::vector<const Property*> modifiable{};  ///< writable properties of types with values
 
     ObjectPath instancePath(const std::string& id) const;
 
-    /** The identifier in the keys of a path or the properties of an instance; none without it. */
+    /** The identifier among keys or properties; none if it is missing. */
     std::optional<std::string> idIn(const std::vector<NamedValue>& values) const;
 };
 
 /**
- * The class of that path, for a load.
- * PlanError when it is not in the schema, or has other keys than one string.
+ * The class of a path.
+ * @throws PlanError if it is not in the schema, or does not have exactly one key, a string
  */
 LoadClass loadClass(const Schema& schema, const ObjectPath& path);
 

@@ -21,12 +21,12 @@ std::size_t kindNamed(const std::string& name) {
     return static_cast<std::size_t>(std::distance(names.begin(), found));
 }
 
-unsigned weightFrom(const std::string& text) {
+unsigned weightFrom(const std::string& digits) {
     unsigned weight = 0;
-    const char* end = text.data() + text.size();
-    const auto read = std::from_chars(text.data(), end, weight);
-    if (text.empty() || read.ec != std::errc() || read.ptr != end || weight > 1'000'000) {
-        throw PlanError("'" + text + "' is no weight; write a number up to 1000000");
+    const char* end = digits.data() + digits.size();
+    const auto read = std::from_chars(digits.data(), end, weight);
+    if (digits.empty() || read.ec != std::errc() || read.ptr != end || weight > 1'000'000) {
+        throw PlanError("'" + digits + "' is not a weight; write a number up to 1000000");
     }
     return weight;
 }
@@ -39,17 +39,17 @@ const char* nameOf(OperationKind kind) {
 
 Mix::Mix() : weights(usualWeights) {}
 
-Mix::Mix(const std::string& text) {
-    std::istringstream parts(text);
+Mix::Mix(const std::string& list) {
+    std::istringstream parts(list);
     for (std::string part; std::getline(parts, part, ',');) {
         const std::size_t equals = part.find('=');
         if (equals == std::string::npos) {
-            throw PlanError("'" + part + "' is no NAME=WEIGHT, such as create=2");
+            throw PlanError("'" + part + "' is not NAME=WEIGHT, such as create=2");
         }
         weights[kindNamed(part.substr(0, equals))] = weightFrom(part.substr(equals + 1));
     }
     if (std::all_of(weights.begin(), weights.end(), [](unsigned each) { return each == 0; })) {
-        throw PlanError("there is nothing to do in the mix '" + text + "'");
+        throw PlanError("all weights of the mix '" + list + "' are 0");
     }
 }
 

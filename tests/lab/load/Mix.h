@@ -8,13 +8,13 @@
 
 namespace cimhost::lab {
 
-/** A load that cannot be run as it is wanted; the text says why. */
+/** A load is not possible. The message says why. */
 class PlanError : public std::runtime_error {
 public:
     using std::runtime_error::runtime_error;
 };
 
-/** What clients do. */
+/** The kinds of requests of clients. */
 enum class OperationKind { create, modify, remove, enumerate, get, associate };
 
 constexpr std::size_t operationKindCount = 6;
@@ -22,14 +22,15 @@ constexpr std::size_t operationKindCount = 6;
 /** "create", "modify", "delete" and so on. */
 const char* nameOf(OperationKind kind);
 
-/** How often clients do what, as weights. */
+/** The weights of the kinds of requests. */
 class Mix {
 public:
-    /** Something of everything, but for associations. */
+    /** The usual weights, without associations. */
     Mix();
 
-    /** Reads "create=2,get=5": what is not named is not done. PlanError when the text is none or nothing is left. */
-    explicit Mix(const std::string& text);
+    /** Reads a list such as "create=2,get=5". Other kinds have the weight 0. @throws PlanError if it is not such a list
+     */
+    explicit Mix(const std::string& list);
 
     unsigned weight(OperationKind kind) const { return weights[static_cast<std::size_t>(kind)]; }
     OperationKind pick(Random& random) const;

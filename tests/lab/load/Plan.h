@@ -10,23 +10,23 @@
 
 namespace cimhost::lab {
 
-/** What a load does. */
+/** The parameters of a load. */
 struct Plan {
     std::vector<LoadClass> classes{};  ///< not empty
     unsigned clients = 8;              ///< at least one
     std::size_t requests = 10'000;     ///< of all clients
     std::uint64_t seed = 1;
     Mix mix{};
-    std::optional<ObjectPath> source{};  ///< whose associations are asked for; needed if the mix has associations
+    std::optional<ObjectPath> source{};  ///< of associations; required if the mix has associations
     std::optional<std::string> associationClass{};
-    bool fills = false;        ///< values go along at creation
-    bool keeps = false;        ///< what is there at the end stays there
-    bool listsChanges = true;  ///< modifications send the list of what they change
-    bool probes = true;        ///< now and then asks for what is not there, and creates what is there already
-    std::size_t shown = 10;    ///< how many wrong answers are told in words
+    bool fills = false;        ///< creations have values
+    bool keeps = false;        ///< the instances are not deleted at the end
+    bool listsChanges = true;  ///< modifications send a property list
+    bool probes = true;        ///< some requests are about missing instances, or create existing ones
+    std::size_t shown = 10;    ///< number of wrong responses to describe
 };
 
-/** PlanError when the plan asks for what cannot be done. */
+/** @throws PlanError if the plan is not possible */
 void requireFeasible(const Plan& plan);
 
 }  // namespace cimhost::lab

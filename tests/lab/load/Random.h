@@ -6,7 +6,7 @@
 
 namespace cimhost::lab {
 
-/** Numbers that look random and are the same for the same seed and stream, on every machine. */
+/** Pseudorandom numbers that depend only on seed and stream. */
 class Random {
 public:
     Random(std::uint64_t seed, std::uint64_t stream) : engine(seed * 1'000'003U + stream) {}
@@ -16,7 +16,7 @@ public:
 
     bool coin() { return below(2) == 0; }
 
-    /** Whether something that happens once in so many times happens now. */
+    /** True once in this many calls, on average. */
     bool oneIn(std::uint64_t times) { return below(times) == 0; }
 
     template <class Item>

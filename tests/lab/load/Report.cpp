@@ -28,10 +28,10 @@ void Statistics::count(OperationKind kind, Time time, bool isWrong) {
     target.wrong += isWrong ? 1 : 0;
 }
 
-void Statistics::note(WrongAnswer answer) {
-    ++wrongByKind[answer.wrong.kind];
-    if (answers.size() < shown) {
-        answers.push_back(std::move(answer));
+void Statistics::note(WrongResponse response) {
+    ++wrongByKind[response.mismatch.kind];
+    if (responses.size() < shown) {
+        responses.push_back(std::move(response));
     }
 }
 
@@ -44,7 +44,7 @@ void Statistics::add(const Statistics& other) {
     for (const auto& [kind, count] : other.wrongByKind) {
         wrongByKind[kind] += count;
     }
-    answers.insert(answers.end(), other.answers.begin(), other.answers.end());
+    responses.insert(responses.end(), other.responses.begin(), other.responses.end());
 }
 
 std::size_t Statistics::wrong() const {
@@ -52,9 +52,9 @@ std::size_t Statistics::wrong() const {
                            [](std::size_t sum, const auto& each) { return sum + each.second; });
 }
 
-std::vector<WrongAnswer> Statistics::first() const {
-    std::vector<WrongAnswer> sorted = answers;
-    std::stable_sort(sorted.begin(), sorted.end(), [](const WrongAnswer& left, const WrongAnswer& right) {
+std::vector<WrongResponse> Statistics::first() const {
+    std::vector<WrongResponse> sorted = responses;
+    std::stable_sort(sorted.begin(), sorted.end(), [](const WrongResponse& left, const WrongResponse& right) {
         return std::tuple(!left.client, left.number, left.client) <
                std::tuple(!right.client, right.number, right.client);
     });

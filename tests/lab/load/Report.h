@@ -13,24 +13,24 @@
 
 namespace cimhost::lab {
 
-/** An answer that was wrong. */
-struct WrongAnswer {
-    std::optional<unsigned> client{};  ///< from 1; none for what was asked at the end
+/** A wrong response. */
+struct WrongResponse {
+    std::optional<unsigned> client{};  ///< from 1; none for the checks at the end
     std::size_t number = 0;            ///< of the client's request, from 1
     std::string request{};             ///< operation and path
-    Mismatch wrong{};
+    Mismatch mismatch{};
 };
 
-/** What was done and found, by one client or by all. */
+/** Times and wrong responses of one client or of all. */
 class Statistics {
 public:
     using Time = std::chrono::nanoseconds;
 
-    /** @param itsShown how many wrong answers are kept in words */
+    /** @param itsShown number of wrong responses to store */
     explicit Statistics(std::size_t itsShown) : shown(itsShown) {}
 
     void count(OperationKind kind, Time time, bool isWrong);
-    void note(WrongAnswer answer);
+    void note(WrongResponse response);
     void add(const Statistics& other);
 
     const std::vector<Time>& times(OperationKind kind) const { return of(kind).times; }
@@ -38,8 +38,8 @@ public:
     const std::map<std::string, std::size_t>& kinds() const { return wrongByKind; }
     std::size_t wrong() const;
 
-    /** The first wrong answers, by number, then by client. */
-    std::vector<WrongAnswer> first() const;
+    /** The first wrong responses, ordered by number, then by client. */
+    std::vector<WrongResponse> first() const;
 
 private:
     struct OfKind {
@@ -52,38 +52,38 @@ private:
     std::size_t shown;
     std::array<OfKind, operationKindCount> operations{};
     std::map<std::string, std::size_t> wrongByKind{};
-    std::vector<WrongAnswer> answers{};
+    std::vector<WrongResponse> responses{};
 };
 
-/** Figures of one kind of request, or of all. */
+/** Figures of one kind of requests, or of all. */
 struct Figures {
     std::string name{};
     std::size_t requests = 0;
     std::size_t wrong = 0;
     double perSecond = 0;
-    double p50 = 0;  ///< microseconds, as those below
+    double p50 = 0;  ///< microseconds, like the following
     double p95 = 0;
     double p99 = 0;
     double max = 0;
 };
 
-/** What a load has to tell. */
+/** The result of a load. */
 struct Report {
     std::string manager{};
     unsigned clients = 0;
     std::uint64_t seed = 0;
     double seconds = 0;
     Figures all{};
-    std::vector<Figures> operations{};  ///< those that were done
-    std::size_t wrong = 0;              ///< also those found at the end, which are no requests of a client
+    std::vector<Figures> operations{};  ///< of the kinds that were sent
+    std::size_t wrong = 0;              ///< including those of the checks at the end
     std::map<std::string, std::size_t> kinds{};
-    std::vector<WrongAnswer> first{};
+    std::vector<WrongResponse> first{};
 };
 
-/** The value below which that share of the times lies, 0 to 1; 0 without any. */
+/** The percentile of some times; 0 if there are none. @param share from 0 to 1 */
 double percentile(const std::vector<Statistics::Time>& sorted, double share);
 
-/** The report's figures out of the statistics. */
+/** Calculates the figures of a report. */
 Report reportOf(const Statistics& statistics, double seconds);
 
 }  // namespace cimhost::lab

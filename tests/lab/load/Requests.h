@@ -31,7 +31,7 @@ inline Request modifyRequest(const LoadClass& known, const std::string& id, cons
     return request;
 }
 
-/** An association operation from the plan's source. */
+/** An association operation for the plan's source. */
 inline Request associationRequest(Operation operation, const Plan& plan) {
     Request request;
     request.operation = operation;

@@ -10,13 +10,13 @@
 namespace cimhost::lab {
 namespace {
 
-std::string dateTimeText(Random& random) {
-    char text[26];
-    std::snprintf(text, sizeof text, "20%02u%02u%02u%02u%02u%02u.000000+000", static_cast<unsigned>(random.below(100)),
-                  static_cast<unsigned>(random.below(12) + 1), static_cast<unsigned>(random.below(28) + 1),
-                  static_cast<unsigned>(random.below(24)), static_cast<unsigned>(random.below(60)),
-                  static_cast<unsigned>(random.below(60)));
-    return text;
+std::string makeDateTime(Random& random) {
+    char dateTime[26];
+    std::snprintf(dateTime, sizeof dateTime, "20%02u%02u%02u%02u%02u%02u.000000+000",
+                  static_cast<unsigned>(random.below(100)), static_cast<unsigned>(random.below(12) + 1),
+                  static_cast<unsigned>(random.below(28) + 1), static_cast<unsigned>(random.below(24)),
+                  static_cast<unsigned>(random.below(60)), static_cast<unsigned>(random.below(60)));
+    return dateTime;
 }
 
 template <class Number>
@@ -24,7 +24,7 @@ Scalar number(Random& random) {
     return static_cast<Number>(random.below(static_cast<std::uint64_t>(std::numeric_limits<Number>::max())));
 }
 
-/** Quarters, which are the same in binary and decimal. */
+/** Multiples of 0.25, which are exact in binary and decimal. */
 template <class Number>
 Scalar fraction(Random& random) {
     return static_cast<Number>(random.below(4000)) / 4;
@@ -37,7 +37,7 @@ struct Maker {
 
 constexpr Maker makers[] = {
     {CMPI_string, [](Random& random) -> Scalar { return "some text " + std::to_string(random.below(1'000'000)); }},
-    {CMPI_dateTime, [](Random& random) -> Scalar { return DateTime{dateTimeText(random)}; }},
+    {CMPI_dateTime, [](Random& random) -> Scalar { return DateTime{makeDateTime(random)}; }},
     {CMPI_boolean, [](Random& random) -> Scalar { return random.coin(); }},
     {CMPI_char16, [](Random& random) -> Scalar { return Char16{static_cast<std::uint16_t>('a' + random.below(26))}; }},
     {CMPI_uint8, number<std::uint8_t>},

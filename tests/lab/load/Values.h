@@ -6,13 +6,13 @@
 
 namespace cimhost::lab {
 
-/** Whether there are values for the property: of a plain type, text or datetime, and no array. */
+/** Whether makeValue() supports a property: a single value of a plain type, a string or a datetime. */
 bool canMakeValue(const Property& property);
 
-/** Some value of the property's type that any store gives back as it is: no odd blanks, no date that does not exist. */
+/** A value of the property's type that survives a round trip: no blanks at its ends, no invalid date. */
 Value makeValue(const Property& property, Random& random);
 
-/** Whether two values are the same, type and all. */
+/** Whether two values have the same type and content. */
 bool sameValue(const Value& left, const Value& right);
 
 }  // namespace cimhost::lab

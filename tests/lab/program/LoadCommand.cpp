@@ -12,15 +12,15 @@ namespace cimhost::lab {
 namespace {
 
 constexpr auto closing =
-    R"(Each client creates instances of its own, whose keys begin with "load", and modifies, gets, enumerates and deletes
-them. It knows what it was told, and holds every answer against it; now and then it asks for what is not there, and
-creates what is there already. At the end, what is there is held against what all clients were told, and deleted.
+    R"(Each client creates instances whose keys begin with "load", and modifies, gets, enumerates and deletes them. It checks
+all responses against the changes that it made. Some requests are about instances that do not exist, or create ones
+that exist. At the end, the instances of all clients are checked and deleted.
 
-A class needs one key, a string. What is modified are its properties with the qualifier Write. Associations are asked
-for with --source, and must be the same as before the load.
+A class must have exactly one key, a string. Properties with the qualifier Write are modified. Associations require
+--source, and must be the same as before the load.
 
-Requests are as concurrent as the clients: a provider that is made for one request at a time answers wrongly, or ends
-this program by a signal, and both say something about it. The exit status is 0 only when no answer was wrong.
+The requests are concurrent: a provider that does not support this returns wrong responses, or ends this program by a
+signal. The exit status is 0 only if no response was wrong.
 
   cimhost-lab load Some_Class --clients 32 --requests 100000 --seed 7
   cimhost-lab --as sfcb load Some_Class Other_Class --mix create=3,modify=4,delete=2,get=5
@@ -37,17 +37,17 @@ Mix mixOf(const LoadArguments& arguments) {
     return arguments.source.empty() ? Mix() : Mix(usualMixWithAssociations);
 }
 
-std::size_t shownOf(const std::string& given, Format format) {
-    const bool isAll = given == "all" || (given.empty() && format == Format::json);
-    return isAll ? std::numeric_limits<std::size_t>::max() : std::stoul(given.empty() ? "10" : given);
+std::size_t shownOf(const std::string& option, Format format) {
+    const bool isAll = option == "all" || (option.empty() && format == Format::json);
+    return isAll ? std::numeric_limits<std::size_t>::max() : std::stoul(option.empty() ? "10" : option);
 }
 
 Plan planOf(const LoadArguments& given, Manager emulated, const Arguments& arguments, const Schema& schema) {
     Plan plan;
-    for (const std::string& text : given.classes) {
-        const ObjectPath path = parseObjectPath(text, schema, arguments.nameSpace);
+    for (const std::string& uri : given.classes) {
+        const ObjectPath path = parseObjectPath(uri, schema, arguments.nameSpace);
         if (!path.keys.empty()) {
-            throw UsageError(text + " names an instance; name a class");
+            throw UsageError(uri + " is the path of an instance; write a class");
         }
         plan.classes.push_back(loadClass(schema, path));
     }
@@ -67,7 +67,7 @@ Plan planOf(const LoadArguments& given, Manager emulated, const Arguments& argum
     return plan;
 }
 
-std::string failureText(const Report& report) {
+std::string failureMessage(const Report& report) {
     return report.wrong == 0
                ? ""
                : std::to_string(report.wrong) + (report.wrong == 1 ? " answer was wrong" : " answers were wrong");
@@ -76,31 +76,31 @@ std::string failureText(const Report& report) {
 }  // namespace
 
 void addLoadCommand(CLI::App& app, LoadArguments& load) {
-    CLI::App* sub = app.add_subcommand("load", "Send requests of many clients at a time and check every answer");
+    CLI::App* sub = app.add_subcommand("load", "Send requests of many concurrent clients and check all responses");
     sub->fallthrough();
     sub->footer(closing);
-    sub->add_option("CLASS", load.classes, "Classes to work on, [namespace:]Class")->required();
-    sub->add_option("--clients", load.clients, "How many clients")
+    sub->add_option("CLASS", load.classes, "Classes of the instances, [namespace:]Class")->required();
+    sub->add_option("--clients", load.clients, "Number of clients")
         ->type_name("NUMBER")
         ->check(CLI::Range(1, 1024))
         ->capture_default_str();
-    sub->add_option("--requests", load.requests, "How many requests, of all clients together")
+    sub->add_option("--requests", load.requests, "Number of requests of all clients")
         ->type_name("NUMBER")
         ->check(CLI::Range(std::size_t{1}, std::size_t{100'000'000}))
         ->capture_default_str();
-    sub->add_option("--seed", load.seed, "Where the random numbers start: the same seed is the same load")
+    sub->add_option("--seed", load.seed, "Seed of the random numbers: the same seed results in the same requests")
         ->type_name("NUMBER")
         ->capture_default_str();
     sub->add_option("--mix", load.mix,
-                    "How often what is done: create, modify, delete, enumerate, get, associate; usually "
+                    "Weights of create, modify, delete, enumerate, get and associate; default "
                     "create=20,modify=25,delete=15,enumerate=5,get=35, and associate=5 with --source")
         ->type_name("NAME=WEIGHT,...");
-    sub->add_option("--source", load.source, "Instance whose associations are asked for")->type_name("PATH");
+    sub->add_option("--source", load.source, "Instance whose associations are requested")->type_name("PATH");
     sub->add_option("--assoc-class", load.associationClass, "Association to follow from there")->type_name("CLASS");
-    sub->add_flag("--fill", load.fills, "Send values along at creation, and expect them to be there");
-    sub->add_flag("--keep", load.keeps, "Leave the instances there at the end");
-    sub->add_flag("--no-probes", load.isTrusting, "Ask only for what is there, create only what is not");
-    sub->add_option("--show", load.shown, "How many wrong answers to show, or all; usually 10, in JSON all")
+    sub->add_flag("--fill", load.fills, "Create instances with values, and expect these values");
+    sub->add_flag("--keep", load.keeps, "Do not delete the instances at the end");
+    sub->add_flag("--no-probes", load.isTrusting, "Do not request missing instances or create existing ones");
+    sub->add_option("--show", load.shown, "Number of wrong responses to show, or all; default 10, in JSON all")
         ->type_name("NUMBER")
         ->check(CLI::IsMember({"all"}) | CLI::Range(std::size_t{0}, std::size_t{100'000'000}));
     sub->callback([&load] { load.isGiven = true; });
@@ -109,18 +109,18 @@ void addLoadCommand(CLI::App& app, LoadArguments& load) {
 CommandResult runLoadCommand(ObjectManager& manager, Manager emulated, const LoadArguments& load,
                              const Arguments& arguments, const Schema& schema) {
     if (arguments.raw) {
-        throw UsageError("--raw shows what a provider did with one request; load has many");
+        throw UsageError("--raw shows the response to one request; load sends many");
     }
     try {
-        Answer<Report> answer = runLoad(manager, planOf(load, emulated, arguments, schema));
-        if (!answer.ok()) {
-            return {"", answer.status};
+        StatusOr<Report> result = runLoad(manager, planOf(load, emulated, arguments, schema));
+        if (!result.ok()) {
+            return {"", result.status};
         }
-        Report& report = answer.value;
+        Report& report = result.value;
         report.manager = nameOf(emulated);
         return {arguments.format == Format::json ? json::format(report) : text::format(report, arguments.style),
                 {},
-                failureText(report)};
+                failureMessage(report)};
     } catch (const PlanError& error) {
         throw UsageError(error.what());
     }

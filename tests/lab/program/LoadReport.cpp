@@ -7,9 +7,9 @@ namespace cimhost {
 namespace {
 
 std::string rounded(double number, int digits) {
-    char text[64];
-    std::snprintf(text, sizeof text, "%.*f", digits, number);
-    return text;
+    char formatted[64];
+    std::snprintf(formatted, sizeof formatted, "%.*f", digits, number);
+    return formatted;
 }
 
 text::Row rowOf(const lab::Figures& figures) {
@@ -23,12 +23,12 @@ text::Row rowOf(const lab::Figures& figures) {
             rounded(figures.max, 1)};
 }
 
-std::string whereText(const lab::WrongAnswer& answer) {
-    const std::string client = answer.client ? "client " + std::to_string(*answer.client) : "at the end";
-    return client + ", request " + std::to_string(answer.number);
+std::string positionOf(const lab::WrongResponse& response) {
+    const std::string client = response.client ? "client " + std::to_string(*response.client) : "at the end";
+    return client + ", request " + std::to_string(response.number);
 }
 
-std::string wrongText(const lab::Report& report) {
+std::string formatWrong(const lab::Report& report) {
     if (report.wrong == 0) {
         return "no answer was wrong\n";
     }
@@ -37,9 +37,9 @@ std::string wrongText(const lab::Report& report) {
         text += ", " + kind + " " + std::to_string(count);
     }
     text += "\n";
-    for (const lab::WrongAnswer& each : report.first) {
-        text += "  " + each.wrong.kind + ": " + whereText(each) + ": " + each.request +
-                "\n    expected: " + each.wrong.expected + "\n    got: " + each.wrong.got + "\n";
+    for (const lab::WrongResponse& each : report.first) {
+        text += "  " + each.mismatch.kind + ": " + positionOf(each) + ": " + each.request +
+                "\n    expected: " + each.mismatch.expected + "\n    got: " + each.mismatch.got + "\n";
     }
     return text;
 }
@@ -54,10 +54,13 @@ Json figuresJson(const lab::Figures& figures) {
             {"microseconds", {{"p50", figures.p50}, {"p95", figures.p95}, {"p99", figures.p99}, {"max", figures.max}}}};
 }
 
-Json wrongJson(const lab::WrongAnswer& answer) {
-    return {{"kind", answer.wrong.kind},         {"client", answer.client ? Json(*answer.client) : Json(nullptr)},
-            {"number", answer.number},           {"request", answer.request},
-            {"expected", answer.wrong.expected}, {"got", answer.wrong.got}};
+Json wrongJson(const lab::WrongResponse& response) {
+    return {{"kind", response.mismatch.kind},
+            {"client", response.client ? Json(*response.client) : Json(nullptr)},
+            {"number", response.number},
+            {"request", response.request},
+            {"expected", response.mismatch.expected},
+            {"got", response.mismatch.got}};
 }
 
 }  // namespace
@@ -70,7 +73,7 @@ std::string text::format(const lab::Report& report, const Style& style) {
     rows.push_back(rowOf(report.all));
     return std::to_string(report.clients) + " clients, " + std::to_string(report.all.requests) + " requests, manager " +
            report.manager + ", seed " + std::to_string(report.seed) + ": " + rounded(report.seconds, 3) + " s\n\n" +
-           aligned(rows, "", style, {Role::name}) + "\n" + wrongText(report);
+           aligned(rows, "", style, {Role::name}) + "\n" + formatWrong(report);
 }
 
 std::string json::format(const lab::Report& report) {
@@ -79,7 +82,7 @@ std::string json::format(const lab::Report& report) {
         operations.push_back(figuresJson(each));
     }
     Json first = Json::array();
-    for (const lab::WrongAnswer& each : report.first) {
+    for (const lab::WrongResponse& each : report.first) {
         first.push_back(wrongJson(each));
     }
     const Json document = {{"manager", report.manager},

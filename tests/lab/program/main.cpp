@@ -4,7 +4,7 @@
 #include "cli/Program.h"
 #include "lab/program/LoadCommand.h"
 
-// cimhost for tests: its commands under emulated object managers, and the load generator.
+// The test tool: the commands of cimhost under emulated object managers, and the load generator.
 
 namespace cimhost::lab {
 namespace {
@@ -18,10 +18,11 @@ constexpr auto examples = R"(  cimhost-lab --as sfcb ci 'Some_Class.InstanceID="
 )";
 
 constexpr auto notes =
-    "With --as, the providers meet the behaviour of another object manager. What would end its provider process is "
-    "reported\nas an error.\n";
+    "With --as, another object manager is emulated. A response that would crash its provider process is reported\nas "
+    "an "
+    "error.\n";
 
-/** The commands of the program, under the manager of --as. */
+/** The commands of the program, under the emulated manager. */
 class LabCommands : public CommandExtension {
 public:
     std::shared_ptr<const ManagerBehaviour> behaviour() const override { return emulationOf(manager); }
@@ -44,7 +45,7 @@ public:
             managers.emplace_back(nameOf(each), each);
         }
         addChoice(app, "--as", "Object manager to emulate: standard (default), sfcb, pegasus or pegasus-empty-key",
-                  manager, std::move(managers))
+                  manager, managers)
             ->type_name("MANAGER");
         addLoadCommand(app, load);
     }

@@ -2,13 +2,13 @@
 
 #include <gtest/gtest.h>
 
-#include "lab/test/Depot.h"
+#include "lab/test/Inventory.h"
 
 namespace cimhost::lab {
 namespace {
 
-std::string kindOf(const Verdict& verdict) {
-    return verdict ? verdict->kind : "right";
+std::string kindOf(const CheckResult& mismatch) {
+    return mismatch ? mismatch->kind : "right";
 }
 
 class ChecksTest : public testing::Test {
@@ -23,7 +23,7 @@ protected:
         return {known.instancePath(id), std::move(properties)};
     }
 
-    /** What is wrong with an enumeration of what must be there and these. */
+    /** Checks an enumeration of the expected instances and these. @return the kind of mismatch, or "right" */
     std::string listing(std::vector<Instance> more, bool hasProperties = false) const {
         more.push_back(thing("old"));
         more.push_back(thing("load-c1-1", {testsupport::named("Text", testsupport::text("x"))}));
@@ -31,33 +31,33 @@ protected:
         return kindOf(checkListing(expectation, more, hasProperties));
     }
 
-    LoadClass known = depotClass();
+    LoadClass known = inventoryClass();
     std::set<std::string> others{"old"};
     ExpectedState state{};
     Expectation expectation{known, others, state, "load-c1-", "load-"};
 };
 
-TEST_F(ChecksTest, AStatusIsTheOneThatMustBe) {
+TEST_F(ChecksTest, AStatusIsTheExpectedOne) {
     EXPECT_EQ(kindOf(checkStatus({}, CMPI_RC_OK)), "right");
     EXPECT_EQ(kindOf(checkStatus({CMPI_RC_ERR_NOT_FOUND, ""}, CMPI_RC_ERR_NOT_FOUND)), "right");
-    const Verdict failure = checkStatus({CMPI_RC_ERR_FAILED, "broken"}, CMPI_RC_OK);
+    const CheckResult failure = checkStatus({CMPI_RC_ERR_FAILED, "broken"}, CMPI_RC_OK);
     ASSERT_TRUE(failure);
     EXPECT_EQ(failure->kind, "status");
     EXPECT_EQ(failure->expected, "OK");
     EXPECT_EQ(failure->got, "error 1 (CMPI_RC_ERR_FAILED): broken");
-    const Verdict success = checkStatus({}, CMPI_RC_ERR_ALREADY_EXISTS);
+    const CheckResult success = checkStatus({}, CMPI_RC_ERR_ALREADY_EXISTS);
     EXPECT_EQ(success->expected, "CMPI_RC_ERR_ALREADY_EXISTS");
     EXPECT_EQ(success->got, "OK");
 }
 
-TEST_F(ChecksTest, ACreatedPathIsTheOneAskedFor) {
+TEST_F(ChecksTest, ACreatedPathIsTheRequestedOne) {
     EXPECT_EQ(kindOf(checkPath(known.instancePath("a"), known.instancePath("a"))), "right");
     EXPECT_EQ(kindOf(checkPath(known.instancePath("b"), known.instancePath("a"))), "path");
-    EXPECT_EQ(kindOf(checkPath(depotPath("Depot_Thing"), known.instancePath("a"))), "path");
-    EXPECT_EQ(kindOf(checkPath(depotClass("Depot_Liar").instancePath("a"), known.instancePath("a"))), "path");
+    EXPECT_EQ(kindOf(checkPath(inventoryPath("Inventory_Thing"), known.instancePath("a"))), "path");
+    EXPECT_EQ(kindOf(checkPath(inventoryClass("Inventory_Liar").instancePath("a"), known.instancePath("a"))), "path");
 }
 
-TEST_F(ChecksTest, AnInstanceHasItsKeyAndTheValuesThatAreKnown) {
+TEST_F(ChecksTest, AnInstanceHasItsKeyAndTheExpectedValues) {
     const ExpectedState::Values values{{"Text", testsupport::text("x")}};
     const auto text = [](const char* value) { return testsupport::named("Text", testsupport::text(value)); };
     EXPECT_EQ(kindOf(checkInstance(known, thing("a", {text("x")}), "a", values)), "right");
@@ -66,10 +66,11 @@ TEST_F(ChecksTest, AnInstanceHasItsKeyAndTheValuesThatAreKnown) {
     EXPECT_EQ(kindOf(checkInstance(known, thing("b", {text("x")}), "a", values)), "value");
     EXPECT_EQ(kindOf(checkInstance(known, thing("a", {text("x")}), "a", {})), "right")
         << "what is not known may be any";
-    EXPECT_EQ(kindOf(checkInstance(known, {depotPath("Depot_Thing"), {text("x")}}, "a", values)), "value") << "no key";
+    EXPECT_EQ(kindOf(checkInstance(known, {inventoryPath("Inventory_Thing"), {text("x")}}, "a", values)), "value")
+        << "no key";
 }
 
-TEST_F(ChecksTest, AListingHasAllThatMustBeThere) {
+TEST_F(ChecksTest, AListingHasAllExpectedInstances) {
     EXPECT_EQ(listing({}), "right");
     EXPECT_EQ(listing({}, true), "right");
     EXPECT_EQ(kindOf(checkListing(expectation, {}, false)), "missing");
@@ -80,11 +81,11 @@ TEST_F(ChecksTest, AListingHasAllThatMustBeThere) {
 TEST_F(ChecksTest, AListingHasNothingTwiceAndNothingElse) {
     EXPECT_EQ(listing({thing("load-c1-1")}), "duplicate");
     EXPECT_EQ(listing({thing("load-c1-4")}), "deleted");
-    EXPECT_EQ(listing({thing("load-c1-3")}), "right") << "nobody knows";
+    EXPECT_EQ(listing({thing("load-c1-3")}), "right") << "doubtful";
     EXPECT_EQ(listing({thing("load-c2-1")}), "right") << "another client's";
     EXPECT_EQ(listing({thing("odd")}), "unknown");
     EXPECT_EQ(listing({thing("")}), "nameless");
-    EXPECT_EQ(listing({{depotPath("Depot_Thing"), {}}}), "nameless");
+    EXPECT_EQ(listing({{inventoryPath("Inventory_Thing"), {}}}), "nameless");
 }
 
 TEST_F(ChecksTest, AListingOfInstancesHasTheirValues) {
@@ -96,11 +97,11 @@ TEST_F(ChecksTest, AListingOfInstancesHasTheirValues) {
 
 TEST_F(ChecksTest, AssociationsAreThoseOfBefore) {
     EXPECT_EQ(kindOf(checkAssociated({"a", "b"}, {"a", "b"})), "right");
-    const Verdict verdict = checkAssociated({}, {"a", "b"});
-    ASSERT_TRUE(verdict);
-    EXPECT_EQ(verdict->kind, "association");
-    EXPECT_EQ(verdict->expected, "2: a...");
-    EXPECT_EQ(verdict->got, "nothing");
+    const CheckResult mismatch = checkAssociated({}, {"a", "b"});
+    ASSERT_TRUE(mismatch);
+    EXPECT_EQ(mismatch->kind, "association");
+    EXPECT_EQ(mismatch->expected, "2: a...");
+    EXPECT_EQ(mismatch->got, "nothing");
 }
 
 }  // namespace

@@ -2,7 +2,7 @@
 #include "host/operations/OperationsFixture.h"
 #include "lab/emulation/ManagerEmulation.h"
 
-// What object managers make of requests before the provider, and of answers after it, where they differ.
+// Differences between object managers in their checks of requests and responses.
 
 namespace {
 
@@ -15,11 +15,11 @@ using testing::HasSubstr;
 using testing::StartsWith;
 using testsupport::text;
 
-/** A class Typed_Thing, whose provider is the witness. */
+/** The class Typed_Thing, whose provider is Echo. */
 class EmulationChecksTest : public OperationsTest {
 protected:
     EmulationChecksTest() {
-        add("Typed_Thing", "Witness", "WitnessProvider", true, false);
+        add("Typed_Thing", "Echo", "EchoProvider", true, false);
         options.classInfo = [](const std::string& name) {
             const cimhost::ClassInfo shape{"Typed_Thing",
                                            {{"Name", CMPI_string, false, true, {}},
@@ -68,7 +68,7 @@ TEST_F(EmulationChecksTest, IntegersOfAnotherTypeReachTheProviderOrAreMadeToFit)
     EXPECT_EQ(modify(Manager::openPegasus, "Size", testsupport::boolean(true)).rc, CMPI_RC_ERR_TYPE_MISMATCH);
 }
 
-TEST_F(EmulationChecksTest, TextForANumberReachesTheProviderEndsTheProcessOrIsRefused) {
+TEST_F(EmulationChecksTest, AStringForANumberReachesTheProviderOrCrashesItOrIsRejected) {
     EXPECT_TRUE(modify(Manager::standard, "Size", text("5")).ok());
     EXPECT_THAT(modify(Manager::sfcb, "Size", text("5")).message,
                 StartsWith("The manager's provider process would have died: "));
@@ -79,7 +79,7 @@ TEST_F(EmulationChecksTest, TextForANumberReachesTheProviderEndsTheProcessOrIsRe
     EXPECT_TRUE(modify(Manager::openPegasus, "Unknown", text("5")).ok()) << "the provider's to judge";
 }
 
-TEST_F(EmulationChecksTest, ADatetimeThatDoesNotExistReachesTheProviderOrIsRefused) {
+TEST_F(EmulationChecksTest, AnInvalidDatetimeReachesTheProviderOrIsRejected) {
     const auto month13 = testsupport::dateTime("20261301000000.000000+000");
     EXPECT_TRUE(modify(Manager::standard, "Since", month13).ok());
     EXPECT_TRUE(modify(Manager::sfcb, "Since", month13).ok());
@@ -87,7 +87,7 @@ TEST_F(EmulationChecksTest, ADatetimeThatDoesNotExistReachesTheProviderOrIsRefus
     EXPECT_TRUE(modify(Manager::openPegasus, "Since", testsupport::dateTime("20261201000000.000000+000")).ok());
 }
 
-TEST_F(EmulationChecksTest, ALongAnswerFailsWhereThereIsALimit) {
+TEST_F(EmulationChecksTest, ALongResponseFailsIfThereIsALimit) {
     for (const Manager each : cimhost::lab::everyManager) {
         EXPECT_TRUE(statusOf(each, 4000).ok());
     }
@@ -95,7 +95,7 @@ TEST_F(EmulationChecksTest, ALongAnswerFailsWhereThereIsALimit) {
     EXPECT_TRUE(statusOf(Manager::openPegasus, 7000).ok());
 }
 
-TEST_F(EmulationChecksTest, APropertyFilterShowsKeysOrOnlyWhatItLists) {
+TEST_F(EmulationChecksTest, APropertyFilterKeepsKeysOrOnlyListedOnes) {
     const auto shown = [this](Manager which) {
         started.reset();
         options.behaviour = cimhost::lab::emulationOf(which);

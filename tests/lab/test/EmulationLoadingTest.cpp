@@ -34,7 +34,7 @@ protected:
         add("Together_Two", "Together", "TogetherProvider", true, false);
     }
 
-    /** Enumerates under a manager that is just started. @return the message of the failure; empty if there is none */
+    /** Enumerates a class with a new manager. @return the message of the failure; empty if there is none */
     std::string errorOf(Manager which, const char* className) {
         started.reset();
         options.behaviour = cimhost::lab::emulationOf(which);
@@ -55,19 +55,19 @@ TEST_F(EmulationLoadingTest, OfTwoFactoriesOneIsCalledOrNone) {
 }
 
 TEST_F(EmulationLoadingTest, AFunctionThatIsMissingIsMissedAtOnceOrWhenItIsCalled) {
-    EXPECT_THAT(errorOf(Manager::standard, "Lazy_Thing"), HasSubstr("functionThatNobodyHas"));
+    EXPECT_THAT(errorOf(Manager::standard, "Lazy_Thing"), HasSubstr("undefinedFunction"));
     EXPECT_EQ(errorOf(Manager::sfcb, "Lazy_Thing"), "Provider not found or not loadable");
     EXPECT_THAT(errorOf(Manager::openPegasus, "Lazy_Thing"), IsEmpty());
 }
 
-TEST_F(EmulationLoadingTest, EveryTypeThatIsRegisteredHasToBeThereAtOnceOrWhenItIsAskedFor) {
+TEST_F(EmulationLoadingTest, RegisteredInterfacesMustExistAtOnceOrWhenTheyAreRequested) {
     for (const Manager each : {Manager::standard, Manager::openPegasus}) {
         EXPECT_THAT(errorOf(each, "Other_Both"), IsEmpty());
     }
     EXPECT_THAT(errorOf(Manager::sfcb, "Other_Both"), HasSubstr("neither Anything_Create_AssociationMI"));
 }
 
-TEST_F(EmulationLoadingTest, WhatIsIdleIsUnloadedAndLoadedAgainUnlessItAsksToStay) {
+TEST_F(EmulationLoadingTest, AnIdleLibraryIsUnloadedUnlessItAsksToStay) {
     for (const Manager each : cimhost::lab::everyManager) {
         EXPECT_THAT(errorOf(each, "Sample_Thing"), IsEmpty());
         EXPECT_TRUE(manager().perform(Request::enumerateInstances(classPath("Other_Thing"))).ok());
@@ -97,7 +97,7 @@ TEST_F(EmulationLoadingTest, AnIdleLibraryStaysIfOneInterfaceAsksOrIfAllDo) {
     }
 }
 
-TEST_F(EmulationLoadingTest, WhatAProcessHadInMemoryThatDiedIsLost) {
+TEST_F(EmulationLoadingTest, ACrashLosesTheProvidersMemory) {
     options.behaviour = cimhost::lab::emulationOf(Manager::sfcb);
     EXPECT_TRUE(manager().perform(Request::enumerateInstances(classPath("Sample_Thing"))).ok());
     EXPECT_THAT(manager().perform(Request::enumerateInstances(classPath("Sample_Throwing"))).status.message,
@@ -114,27 +114,27 @@ TEST_F(EmulationLoadingTest, WhatAProcessHadInMemoryThatDiedIsLost) {
     EXPECT_TRUE(isLoaded("libSampleProvider.so")) << "it lives on";
 }
 
-TEST_F(EmulationLoadingTest, ALibraryIsLostWhenNobodyIsInsideAnyMore) {
+TEST_F(EmulationLoadingTest, ACrashedLibraryIsUnloadedAfterTheLastRequest) {
     options.behaviour = cimhost::lab::emulationOf(Manager::sfcb);
     EXPECT_FALSE(manager().perform(Request::enumerateInstances(classPath("Sample_CallsSample_Throwing"))).ok());
     EXPECT_FALSE(isLoaded("libSampleProvider.so"));
 }
 
-TEST_F(EmulationLoadingTest, StoppingDoesNotWaitForWhoIsInside) {
-    add("Witness_Thing", "Witness", "WitnessProvider", true, false);
-    add("Sample_CallsWitness_Thing", "Sample", "SampleProvider", true, false);
+TEST_F(EmulationLoadingTest, StoppingDoesNotWaitForRunningRequests) {
+    add("Echo_Thing", "Echo", "EchoProvider", true, false);
+    add("Sample_CallsEcho_Thing", "Sample", "SampleProvider", true, false);
     for (const Manager each : cimhost::lab::everyManager) {
         started.reset();
         options.behaviour = cimhost::lab::emulationOf(each);
         log.clear();
-        awaited = "witness factory";
+        awaited = "echo factory";
         whenLogged = [this] {
             manager().stop();
             log.emplace_back("stopped");
         };
-        manager().perform(Request::enumerateInstances(classPath("Sample_CallsWitness_Thing")));
-        EXPECT_THAT(
-            log, testing::ElementsAre("instance factory", "witness factory", "instance cleanup at the end", "stopped"));
+        manager().perform(Request::enumerateInstances(classPath("Sample_CallsEcho_Thing")));
+        EXPECT_THAT(log,
+                    testing::ElementsAre("instance factory", "echo factory", "instance cleanup at the end", "stopped"));
         const auto late = manager().perform(Request::enumerateInstances(classPath("Sample_Thing")));
         EXPECT_EQ(late.status.rc, CMPI_RC_ERR_FAILED);
         EXPECT_EQ(late.status.message, "The object manager is stopping.");

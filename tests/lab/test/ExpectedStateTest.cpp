@@ -11,7 +11,7 @@ using cimhost::lab::Random;
 using testing::ElementsAre;
 using testing::Key;
 
-TEST(ExpectedState, KeepsWhatItWasTold) {
+TEST(ExpectedState, StoresChanges) {
     ExpectedState state;
     EXPECT_TRUE(state.isEmpty());
     state.created("a", {});
@@ -24,7 +24,7 @@ TEST(ExpectedState, KeepsWhatItWasTold) {
     EXPECT_FALSE(state.isDoubtful("a"));
 }
 
-TEST(ExpectedState, AnyIsOneThatIsThere) {
+TEST(ExpectedState, AnyReturnsAnInstance) {
     ExpectedState state;
     Random random(1, 1);
     for (const char* id : {"a", "b", "c", "d"}) {
@@ -39,7 +39,7 @@ TEST(ExpectedState, AnyIsOneThatIsThere) {
     EXPECT_TRUE(state.isEmpty());
 }
 
-TEST(ExpectedState, WhatIsDoubtfulIsNotKnown) {
+TEST(ExpectedState, ADoubtfulInstanceIsUnknown) {
     ExpectedState state;
     state.created("a", {});
     state.doubt("a");

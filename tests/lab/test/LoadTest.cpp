@@ -3,10 +3,10 @@
 #include <gmock/gmock.h>
 
 #include "lab/emulation/ManagerEmulation.h"
-#include "lab/test/Depot.h"
+#include "lab/test/Inventory.h"
 #include "operations/LoadedLibrary.h"
 
-// Loads against providers that are right and providers that are wrong; the verdict does not depend on luck.
+// Loads against providers that are right and providers that are wrong; the mismatch does not depend on luck.
 
 namespace {
 
@@ -21,16 +21,16 @@ using testing::Key;
 
 class LoadTest : public testing::Test {
 protected:
-    explicit LoadTest(Manager which = Manager::standard) : manager(depotOptions(which), depotRegistry()) {
+    explicit LoadTest(Manager which = Manager::standard) : manager(inventoryOptions(which), inventoryRegistry()) {
         plan.requests = 800;
         plan.clients = 4;
         plan.listsChanges = cimhost::lab::clientsSendPropertyLists(which);
     }
 
-    Report run(const std::vector<std::string>& classes = {"Depot_Thing"}) {
+    Report run(const std::vector<std::string>& classes = {"Inventory_Thing"}) {
         plan.classes.clear();
         for (const std::string& each : classes) {
-            plan.classes.push_back(depotClass(each));
+            plan.classes.push_back(inventoryClass(each));
         }
         auto report = runLoad(manager, plan);
         EXPECT_TRUE(report.ok()) << report.status.message;
@@ -38,13 +38,13 @@ protected:
     }
 
     std::size_t countOf(const std::string& className) {
-        return manager.perform(Request::enumerateInstanceNames(depotPath(className))).paths.size();
+        return manager.perform(Request::enumerateInstanceNames(inventoryPath(className))).paths.size();
     }
 
     static std::string firstOf(const Report& report) {
         return report.first.empty() ? ""
-                                    : report.first.front().request + ": " + report.first.front().wrong.expected + ", " +
-                                          report.first.front().wrong.got;
+                                    : report.first.front().request + ": " + report.first.front().mismatch.expected +
+                                          ", " + report.first.front().mismatch.got;
     }
 
     cimhost::ObjectManager manager;
@@ -56,19 +56,19 @@ protected:
     LoadAsManager() : LoadTest(GetParam()) {}
 };
 
-TEST_P(LoadAsManager, AProviderThatIsRightHasNoWrongAnswer) {
-    plan.source = depotClass().instancePath("any");
-    plan.associationClass = "Depot_Holds";
+TEST_P(LoadAsManager, ARightProviderHasNoWrongAnswer) {
+    plan.source = inventoryClass().instancePath("any");
+    plan.associationClass = "Inventory_Holds";
     plan.mix = Mix("create=4,modify=5,delete=3,enumerate=1,get=7,associate=2");
     plan.clients = 16;
     plan.requests = 3200;
     plan.fills = true;
-    const Report report = run({"Depot_Thing", "Depot_Shelf"});
+    const Report report = run({"Inventory_Thing", "Inventory_Shelf"});
     EXPECT_THAT(report.kinds, IsEmpty()) << firstOf(report);
     EXPECT_EQ(report.all.requests, 3200U);
     EXPECT_EQ(report.operations.size(), 6U);
     EXPECT_EQ(report.clients, 16U);
-    EXPECT_EQ(countOf("Depot_Thing"), 0U) << "nothing is left";
+    EXPECT_EQ(countOf("Inventory_Thing"), 0U) << "nothing is left";
 }
 
 INSTANTIATE_TEST_SUITE_P(Managers, LoadAsManager, testing::ValuesIn(cimhost::lab::everyManager),
@@ -84,67 +84,67 @@ void PrintTo(const WrongClass& wrong, std::ostream* out) {
 
 class LoadOnWrongClass : public LoadTest, public testing::WithParamInterface<WrongClass> {};
 
-TEST_P(LoadOnWrongClass, TellsWhatIsWrong) {
+TEST_P(LoadOnWrongClass, ReportsTheMismatch) {
     const Report report = run({GetParam().className});
     EXPECT_THAT(report.kinds, testing::Contains(Key(GetParam().kind))) << firstOf(report);
     EXPECT_FALSE(report.first.empty());
     EXPECT_THAT(run().kinds, IsEmpty()) << "the other class is right";
 }
 
-INSTANTIATE_TEST_SUITE_P(Depot, LoadOnWrongClass,
-                         testing::Values(WrongClass{"Depot_Liar", "value"}, WrongClass{"Depot_Hoarder", "deleted"},
-                                         WrongClass{"Depot_Forgetful", "missing"},
-                                         WrongClass{"Depot_Inventive", "unknown"},
-                                         WrongClass{"Depot_Nameless", "nameless"},
-                                         WrongClass{"Depot_Repeating", "duplicate"},
-                                         WrongClass{"Depot_Misnaming", "path"}, WrongClass{"Depot_Generous", "status"},
-                                         WrongClass{"Depot_Polite", "status"}, WrongClass{"Depot_Throwing", "status"},
-                                         WrongClass{"Depot_Silent", "status"}),
-                         [](const auto& each) { return std::string(each.param.className).substr(6); });
+INSTANTIATE_TEST_SUITE_P(
+    Inventory, LoadOnWrongClass,
+    testing::Values(WrongClass{"Inventory_Liar", "value"}, WrongClass{"Inventory_Hoarder", "deleted"},
+                    WrongClass{"Inventory_Forgetful", "missing"}, WrongClass{"Inventory_Inventive", "unknown"},
+                    WrongClass{"Inventory_Nameless", "nameless"}, WrongClass{"Inventory_Repeating", "duplicate"},
+                    WrongClass{"Inventory_Misnaming", "path"}, WrongClass{"Inventory_Generous", "status"},
+                    WrongClass{"Inventory_Polite", "status"}, WrongClass{"Inventory_Throwing", "status"},
+                    WrongClass{"Inventory_Silent", "status"}),
+    [](const auto& each) { return std::string(each.param.className).substr(6); });
 
-TEST_F(LoadTest, OnlyOneThingIsWrongWhereOnlyOneThingIs) {
-    for (const auto& [className, kind] : {std::pair("Depot_Liar", "value"), std::pair("Depot_Forgetful", "missing"),
-                                          std::pair("Depot_Misnaming", "path"), std::pair("Depot_Polite", "status")}) {
+TEST_F(LoadTest, ASingleDefectIsASingleMismatch) {
+    for (const auto& [className, kind] :
+         {std::pair("Inventory_Liar", "value"), std::pair("Inventory_Forgetful", "missing"),
+          std::pair("Inventory_Misnaming", "path"), std::pair("Inventory_Polite", "status")}) {
         const Report report = run({className});
         EXPECT_THAT(report.kinds, ElementsAre(Key(kind))) << className << " " << firstOf(report);
     }
 }
 
-TEST_F(LoadTest, WithoutProbesOnlyWhatIsThereIsAskedFor) {
-    EXPECT_THAT(run({"Depot_Polite"}).kinds, testing::Contains(Key("status"))) << "success for what is not there";
+TEST_F(LoadTest, WithoutProbesOnlyExistingInstancesAreRequested) {
+    EXPECT_THAT(run({"Inventory_Polite"}).kinds, testing::Contains(Key("status"))) << "success for what is not there";
     plan.probes = false;
-    EXPECT_THAT(run({"Depot_Polite"}).kinds, IsEmpty());
-    EXPECT_THAT(run({"Depot_Liar"}).kinds, testing::Contains(Key("value")));
+    EXPECT_THAT(run({"Inventory_Polite"}).kinds, IsEmpty());
+    EXPECT_THAT(run({"Inventory_Liar"}).kinds, testing::Contains(Key("value")));
 }
 
 TEST_F(LoadTest, AssociationsThatChangeAreWrong) {
-    plan.source = depotClass().instancePath("any");
-    plan.associationClass = "Depot_Wandering";
+    plan.source = inventoryClass().instancePath("any");
+    plan.associationClass = "Inventory_Wandering";
     plan.mix = Mix("get=1,associate=1");
     EXPECT_THAT(run().kinds, ElementsAre(Key("association")));
-    plan.associationClass = "Depot_Holds";
+    plan.associationClass = "Inventory_Holds";
     EXPECT_THAT(run().kinds, IsEmpty()) << "references that are not supported stay so";
 }
 
 TEST_F(LoadTest, TheSameSeedIsTheSameLoad) {
     plan.clients = 1;
-    const Report first = run({"Depot_Liar"});
-    const Report second = run({"Depot_Liar"});
+    const Report first = run({"Inventory_Liar"});
+    const Report second = run({"Inventory_Liar"});
     EXPECT_EQ(first.wrong, second.wrong);
     EXPECT_EQ(firstOf(first), firstOf(second));
     plan.seed = 2;
-    EXPECT_NE(firstOf(run({"Depot_Liar"})), firstOf(first));
+    EXPECT_NE(firstOf(run({"Inventory_Liar"})), firstOf(first));
 }
 
-TEST_F(LoadTest, WhatWasThereStaysAndWhatIsKeptIsNotMistaken) {
-    manager.perform(Request::createInstance(depotClass().instancePath("mine"), {}));
+TEST_F(LoadTest, InitialInstancesRemainAndAreNotMistaken) {
+    manager.perform(Request::createInstance(inventoryClass().instancePath("mine"), {}));
     plan.keeps = true;
     EXPECT_THAT(run().kinds, IsEmpty());
-    const std::size_t kept = countOf("Depot_Thing");
+    const std::size_t kept = countOf("Inventory_Thing");
     EXPECT_GT(kept, 1U);
     plan.keeps = false;
     EXPECT_THAT(run().kinds, IsEmpty()) << "with the same seed, but other names";
-    EXPECT_EQ(countOf("Depot_Thing"), kept);
+    EXPECT_EQ(countOf("Inventory_Thing"), kept);
 }
 
 TEST_F(LoadTest, RequestsAreSharedOutToTheLast) {
@@ -156,20 +156,20 @@ TEST_F(LoadTest, RequestsAreSharedOutToTheLast) {
 }
 
 TEST_F(LoadTest, AFailureBeforeTheLoadIsTheAnswer) {
-    plan.classes = {depotClass()};
+    plan.classes = {inventoryClass()};
     plan.classes.front().path.nameSpace = "root/nowhere";
     EXPECT_EQ(runLoad(manager, plan).status.rc, CMPI_RC_ERR_INVALID_NAMESPACE);
-    plan.classes = {depotClass()};
-    plan.source = depotClass().instancePath("any");
-    plan.associationClass = "Depot_Nothing";
+    plan.classes = {inventoryClass()};
+    plan.source = inventoryClass().instancePath("any");
+    plan.associationClass = "Inventory_Nothing";
     EXPECT_EQ(runLoad(manager, plan).status.rc, CMPI_RC_ERR_INVALID_CLASS);
 }
 
 TEST_F(LoadTest, AProviderThatCannotBeLoadedIsALibraryError) {
-    auto options = depotOptions(Manager::standard);
+    auto options = inventoryOptions(Manager::standard);
     options.libraries.searchPath = {"/nonexistent"};
-    cimhost::ObjectManager without(options, depotRegistry());
-    plan.classes = {depotClass()};
+    cimhost::ObjectManager without(options, inventoryRegistry());
+    plan.classes = {inventoryClass()};
     EXPECT_THROW(runLoad(without, plan), cimhost::LibraryError);
 }
 
@@ -178,8 +178,8 @@ protected:
     LoadAsSfcb() : LoadTest(Manager::sfcb) {}
 };
 
-TEST_F(LoadAsSfcb, WhatWouldEndTheProcessIsTold) {
-    for (const char* className : {"Depot_Throwing", "Depot_Silent"}) {
+TEST_F(LoadAsSfcb, ACrashIsReported) {
+    for (const char* className : {"Inventory_Throwing", "Inventory_Silent"}) {
         EXPECT_THAT(run({className}).kinds, testing::Contains(Key("died"))) << className;
     }
 }

@@ -2,7 +2,7 @@
 
 #include "host/cli/Program.h"
 
-// The program as other object managers: what a provider would have done to them is said, not suffered.
+// The program under emulated object managers. Crashes are reported.
 
 namespace cimhost::test {
 namespace {
@@ -16,7 +16,7 @@ TEST(ManagerOption, TheStandardOneIsTheDefault) {
     EXPECT_EQ(named.output, run({"ei", "Test_Box"}).output);
 }
 
-TEST(ManagerOption, AnExceptionWouldEndTheProcessOrIsUnknown) {
+TEST(ManagerOption, AnExceptionIsACrashOrUnknown) {
     const Ended dead = run({"--as", "sfcb", "gi", "Test_Answer.Code=999"});
     EXPECT_EQ(dead.status, 1);
     EXPECT_EQ(dead.error,
@@ -27,14 +27,14 @@ TEST(ManagerOption, AnExceptionWouldEndTheProcessOrIsUnknown) {
     EXPECT_EQ(unknown.error, "cimhost-lab: error 1 (CMPI_RC_ERR_FAILED): Unknown error.\n");
 }
 
-TEST(ManagerOption, RawShowsWhatTheProviderDidAndSaysWhatComesOfIt) {
+TEST(ManagerOption, RawShowsTheResponseAndTheCrash) {
     const Ended dead = run({"--as", "sfcb", "--raw", "gi", "Test_Answer.Code=999"});
     EXPECT_EQ(dead.status, 1);
-    EXPECT_THAT(dead.output, HasSubstr("exception: \"An exception left the provider"));
+    EXPECT_THAT(dead.output, HasSubstr("exception: \"The provider threw an exception"));
     EXPECT_THAT(dead.error, HasSubstr("would have died"));
 }
 
-TEST(ManagerOption, AModificationHasAllPropertiesAndAListOfItsOwn) {
+TEST(ManagerOption, AModificationHasAllPropertiesAndAList) {
     const Ended standard = run({"--raw", "mi", "Test_Box.Name=\"A\"", "Size=5"});
     EXPECT_EQ(standard.output,
               "status: 0 (CMPI_RC_OK)\n1. instance root/cimv2:Test_Box.Name=\"A\"\n     Size  uint32  5\n"
@@ -48,7 +48,7 @@ TEST(ManagerOption, AModificationHasAllPropertiesAndAListOfItsOwn) {
 TEST(ManagerOption, AnotherNameIsWrongUsage) {
     const Ended refused = run({"--as", "cimom", "ei", "Test_Box"});
     EXPECT_EQ(refused.status, 2);
-    EXPECT_THAT(refused.error, HasSubstr("cimom is not one of standard, sfcb, pegasus and pegasus-empty-key"));
+    EXPECT_THAT(refused.error, HasSubstr("cimom not in {standard,sfcb,pegasus,pegasus-empty-key}"));
 }
 
 }  // namespace

@@ -2,7 +2,7 @@
 
 #include <gmock/gmock.h>
 
-#include "lab/test/Depot.h"
+#include "lab/test/Inventory.h"
 
 namespace {
 
@@ -24,7 +24,7 @@ std::string errorOf(Body body) {
     }
 }
 
-TEST(Mix, DoesWhatIsNamedAsOftenAsItSays) {
+TEST(Mix, ChoosesKindsByWeight) {
     const Mix mix("create=1,get=3");
     Random random(1, 1);
     int gets = 0;
@@ -46,30 +46,30 @@ TEST(Mix, UsuallyDoesEverythingButAssociations) {
     EXPECT_EQ(mix.weight(OperationKind::associate), 0U);
 }
 
-TEST(Mix, RefusesWhatItCannotRead) {
+TEST(Mix, RejectsInvalidLists) {
     EXPECT_THAT(errorOf([] { Mix("create=1,fly=2"); }), HasSubstr("fly is not one of create, modify"));
-    EXPECT_THAT(errorOf([] { Mix("create"); }), HasSubstr("'create' is no NAME=WEIGHT"));
-    EXPECT_THAT(errorOf([] { Mix("create=x"); }), HasSubstr("'x' is no weight"));
-    EXPECT_THAT(errorOf([] { Mix("create=-1"); }), HasSubstr("'-1' is no weight"));
-    EXPECT_THAT(errorOf([] { Mix("create="); }), HasSubstr("'' is no weight"));
-    EXPECT_THAT(errorOf([] { Mix("create=1000001"); }), HasSubstr("no weight"));
-    EXPECT_THAT(errorOf([] { Mix("create=0"); }), HasSubstr("nothing to do"));
-    EXPECT_THAT(errorOf([] { Mix(""); }), HasSubstr("nothing to do"));
+    EXPECT_THAT(errorOf([] { Mix("create"); }), HasSubstr("'create' is not NAME=WEIGHT"));
+    EXPECT_THAT(errorOf([] { Mix("create=x"); }), HasSubstr("'x' is not a weight"));
+    EXPECT_THAT(errorOf([] { Mix("create=-1"); }), HasSubstr("'-1' is not a weight"));
+    EXPECT_THAT(errorOf([] { Mix("create="); }), HasSubstr("'' is not a weight"));
+    EXPECT_THAT(errorOf([] { Mix("create=1000001"); }), HasSubstr("not a weight"));
+    EXPECT_THAT(errorOf([] { Mix("create=0"); }), HasSubstr("are 0"));
+    EXPECT_THAT(errorOf([] { Mix(""); }), HasSubstr("are 0"));
 }
 
 TEST(LoadClass, TakesKeyAndModifiablePropertiesFromTheSchema) {
-    const LoadClass thing = depotClass("depot_thing");
+    const LoadClass thing = inventoryClass("inventory_thing");
     EXPECT_EQ(thing.key, "Name");
     std::vector<std::string> names;
     for (const cimhost::Property* each : thing.modifiable) {
         names.push_back(each->name);
     }
     EXPECT_THAT(names, testing::ElementsAre("Text", "Number", "Open"));
-    EXPECT_TRUE(depotClass("Depot_Sealed").modifiable.empty()) << "no values for arrays";
+    EXPECT_TRUE(inventoryClass("Inventory_Sealed").modifiable.empty()) << "no values for arrays";
 }
 
 TEST(LoadClass, FindsIdentifiersInPathsAndInstances) {
-    const LoadClass thing = depotClass();
+    const LoadClass thing = inventoryClass();
     EXPECT_EQ(thing.idIn(thing.instancePath("x").keys), "x");
     EXPECT_EQ(thing.idIn({}), std::nullopt);
     EXPECT_EQ(thing.idIn({testsupport::named("NAME", testsupport::text("y"))}), "y");
@@ -77,21 +77,21 @@ TEST(LoadClass, FindsIdentifiersInPathsAndInstances) {
     EXPECT_EQ(thing.idIn({testsupport::named("Name", testsupport::nullOf(CMPI_string))}), std::nullopt);
 }
 
-TEST(LoadClass, RefusesClassesThatClientsCannotNameInstancesOf) {
-    EXPECT_THAT(errorOf([] { depotClass("Depot_Numbered"); }), HasSubstr("other keys than one string"));
-    EXPECT_THAT(errorOf([] { depotClass("Depot_Pair"); }), HasSubstr("other keys than one string"));
-    EXPECT_THAT(errorOf([] { depotClass("Depot_Missing"); }), HasSubstr("not in the schema"));
+TEST(LoadClass, RejectsClassesWithoutASingleStringKey) {
+    EXPECT_THAT(errorOf([] { inventoryClass("Inventory_Numbered"); }), HasSubstr("other keys than one string"));
+    EXPECT_THAT(errorOf([] { inventoryClass("Inventory_Pair"); }), HasSubstr("other keys than one string"));
+    EXPECT_THAT(errorOf([] { inventoryClass("Inventory_Missing"); }), HasSubstr("not in the schema"));
 }
 
 TEST(Plan, MustBeFeasible) {
     Plan plan;
-    plan.classes = {depotClass()};
+    plan.classes = {inventoryClass()};
     EXPECT_EQ(errorOf([&] { requireFeasible(plan); }), "");
     plan.mix = Mix("associate=1");
-    EXPECT_THAT(errorOf([&] { requireFeasible(plan); }), HasSubstr("no instance whose associations"));
+    EXPECT_THAT(errorOf([&] { requireFeasible(plan); }), HasSubstr("no instance to start from"));
     plan.mix = Mix();
-    plan.classes.push_back(depotClass("Depot_Sealed"));
-    EXPECT_THAT(errorOf([&] { requireFeasible(plan); }), HasSubstr("Depot_Sealed has no property"));
+    plan.classes.push_back(inventoryClass("Inventory_Sealed"));
+    EXPECT_THAT(errorOf([&] { requireFeasible(plan); }), HasSubstr("Inventory_Sealed has no property"));
     plan.mix = Mix("create=1,delete=1");
     EXPECT_EQ(errorOf([&] { requireFeasible(plan); }), "");
 }

@@ -8,12 +8,12 @@ using cimhost::lab::OperationKind;
 using cimhost::lab::percentile;
 using cimhost::lab::Report;
 using cimhost::lab::Statistics;
-using cimhost::lab::WrongAnswer;
+using cimhost::lab::WrongResponse;
 using std::chrono::microseconds;
 using testing::ElementsAre;
 using testing::Pair;
 
-WrongAnswer wrong(std::optional<unsigned> client, std::size_t number, const char* kind) {
+WrongResponse wrong(std::optional<unsigned> client, std::size_t number, const char* kind) {
     return {client, number, "request", {kind, "this", "that"}};
 }
 
@@ -55,7 +55,7 @@ TEST(Statistics, AddsUp) {
     EXPECT_THAT(report.kinds, ElementsAre(Pair("deleted", 1), Pair("status", 1), Pair("value", 1)));
 }
 
-TEST(Statistics, TellsTheFirstInWords) {
+TEST(Statistics, DescribesTheFirst) {
     Statistics all(3);
     Statistics one(3);
     for (std::size_t number = 1; number <= 5; ++number) {

@@ -1,14 +1,10 @@
 #include "ProviderKit.h"
 
-// A provider that refers to a function that nobody has, and calls it only when it is asked for an instance.
+// A provider with an undefined function, which getInstance calls.
 
-extern "C" CMPIStatus functionThatNobodyHas();
+extern "C" CMPIStatus undefinedFunction();
 
 namespace {
-
-CMPIStatus cleanup(CMPIInstanceMI*, const CMPIContext*, CMPIBoolean) {
-    return kit::ok;
-}
 
 CMPIStatus enumerateInstances(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*,
                               const char**) {
@@ -16,11 +12,11 @@ CMPIStatus enumerateInstances(CMPIInstanceMI*, const CMPIContext*, const CMPIRes
 }
 
 CMPIStatus getInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*, const char**) {
-    return functionThatNobodyHas();
+    return undefinedFunction();
 }
 
-CMPIInstanceMIFT table{CMPIVersion200, CMPIVersion200, "instanceLazy", cleanup, nullptr, enumerateInstances,
-                       getInstance,    nullptr,        nullptr,        nullptr, nullptr};
+CMPIInstanceMIFT table{CMPIVersion200, CMPIVersion200, "instanceLazy", kit::cleanup, nullptr, enumerateInstances,
+                       getInstance,    nullptr,        nullptr,        nullptr,      nullptr};
 CMPIInstanceMI interface { nullptr, &table };
 
 }  // namespace

@@ -2,7 +2,7 @@
 
 #include "ProviderKit.h"
 
-// A library with several providers: any name through the generic factory, and some whose factories fail.
+// A library with several providers: any name by the generic factory, and some whose factories fail.
 
 namespace {
 
@@ -23,12 +23,8 @@ CMPIInstanceMIFT table{CMPIVersion200, CMPIVersion200, "instanceOther", cleanup,
                        nullptr,        nullptr,        nullptr,         nullptr, nullptr};
 CMPIInstanceMI interface { nullptr, &table };
 
-CMPIStatus cleanupAssociation(CMPIAssociationMI*, const CMPIContext*, CMPIBoolean) {
-    return kit::ok;
-}
-
-CMPIAssociationMIFT associationTable{
-    CMPIVersion200, CMPIVersion200, "associationOther", cleanupAssociation, nullptr, nullptr, nullptr, nullptr};
+CMPIAssociationMIFT associationTable{CMPIVersion200, CMPIVersion200, "associationOther", kit::cleanup, nullptr, nullptr,
+                                     nullptr,        nullptr};
 CMPIAssociationMI association{nullptr, &associationTable};
 
 int refusals = 2;
@@ -37,7 +33,7 @@ int refusals = 2;
 
 KIT_EXPORT CMPIInstanceMI* _Generic_Create_InstanceMI(const CMPIBroker* itsBroker, const CMPIContext*, const char* name,
                                                       CMPIStatus*) {
-    kit::keep(broker, itsBroker);
+    kit::store(broker, itsBroker);
     providerName = name;
     return &interface;
 }
@@ -56,13 +52,13 @@ KIT_EXPORT CMPIInstanceMI* Throwing_Create_InstanceMI(const CMPIBroker*, const C
     throw std::runtime_error("no luck");
 }
 
-/** Refuses twice, then works. */
+/** Fails twice, then succeeds. */
 KIT_EXPORT CMPIInstanceMI* Late_Create_InstanceMI(const CMPIBroker* itsBroker, const CMPIContext* context,
                                                   CMPIStatus* status) {
     return --refusals >= 0 ? nullptr : _Generic_Create_InstanceMI(itsBroker, context, "Late", status);
 }
 
-/** Asks for an instance of its own class while it starts. */
+/** Enumerates its own class in its factory. */
 KIT_EXPORT CMPIInstanceMI* Selfish_Create_InstanceMI(const CMPIBroker* itsBroker, const CMPIContext* context,
                                                      CMPIStatus* status) {
     const CMPIObjectPath* own = itsBroker->eft->newObjectPath(itsBroker, "root/cimv2", "Selfish_Thing", nullptr);
@@ -70,7 +66,7 @@ KIT_EXPORT CMPIInstanceMI* Selfish_Create_InstanceMI(const CMPIBroker* itsBroker
     return status->rc == CMPI_RC_OK ? &interface : nullptr;
 }
 
-/** Its association interface does not ask to stay, as its instance interface does. */
+/** Its association interface does not ask to stay loaded; its instance interface does. */
 KIT_EXPORT CMPIAssociationMI* Half_Create_AssociationMI(const CMPIBroker* itsBroker, const CMPIContext*, CMPIStatus*) {
     kit::log(itsBroker, "half factory");
     return &association;

@@ -3,14 +3,14 @@
 
 #include "ProviderKit.h"
 
-// A provider "Sample" whose classes behave well and badly. It logs what becomes of its interfaces.
+// The provider "Sample", some of whose classes fail. It logs calls of factories and cleanup.
 
 namespace {
 
 const CMPIBroker* broker = nullptr;
-std::map<std::string, std::string> things;  ///< Sample_Thing: text by name
+std::map<std::string, std::string> things;  ///< property Text of each Sample_Thing, by name
 
-/** A list of what the provider was given, as text. */
+/** Describes the properties of an instance. */
 std::string describe(const CMPIInstance* instance) {
     std::string all;
     const CMPICount count = instance->ft->getPropertyCount(instance, nullptr);
@@ -29,7 +29,7 @@ CMPIInstance* thing(const CMPIObjectPath* like, const std::string& name, const s
     return instance;
 }
 
-/** Returns what an up-call finds, and how it ended. */
+/** Returns the results and the status of an up-call. */
 CMPIStatus returnUpCall(const CMPIContext* context, const CMPIResult* result, const CMPIObjectPath* path) {
     CMPIStatus status = kit::ok;
     const CMPIEnumeration* found = broker->bft->enumerateInstances(broker, context, path, nullptr, &status);
@@ -39,7 +39,7 @@ CMPIStatus returnUpCall(const CMPIContext* context, const CMPIResult* result, co
     return status;
 }
 
-/** Counts down through up-calls to itself: Sample_Recursive.Name="3" asks for "2", and so on. */
+/** Counts down by up-calls to itself: Sample_Recursive.Name="3" gets "2", and so on. */
 CMPIStatus countDown(const CMPIContext* context, const CMPIResult* result, const CMPIObjectPath* path) {
     const int depth = std::stoi(kit::key(path, "Name"));
     std::string below = "bottom";
@@ -58,7 +58,7 @@ CMPIStatus countDown(const CMPIContext* context, const CMPIResult* result, const
     return kit::ok;
 }
 
-/** What the context says, as the name of an instance. */
+/** Describes the context. */
 std::string describe(const CMPIContext* context) {
     std::string all;
     for (const char* name : {CMPIInitNameSpace, CMPIPrincipal}) {
@@ -165,7 +165,7 @@ CMPIInstanceMIFT instanceTable{CMPIVersion200,         CMPIVersion200,     "inst
                                modifyInstance,         deleteInstance,     nullptr};
 CMPIInstanceMI instanceMI{nullptr, &instanceTable};
 
-// Associations: each answers with the association class that it was asked for.
+// Associations: each returns the requested association class.
 
 CMPIStatus associationCleanup(CMPIAssociationMI*, const CMPIContext*, CMPIBoolean) {
     kit::log(broker, "association cleanup at the end");
@@ -193,7 +193,7 @@ CMPIStatus associatorNames(CMPIAssociationMI*, const CMPIContext*, const CMPIRes
     return kit::ok;
 }
 
-/** Only Sample_Link knows its references. */
+/** Only Sample_Link supports references. */
 CMPIStatus references(CMPIAssociationMI*, const CMPIContext*, const CMPIResult* result, const CMPIObjectPath* path,
                       const char* resultClass, const char*, const char**) {
     if (std::string(orNone(resultClass)) != "Sample_Link") {
@@ -203,26 +203,21 @@ CMPIStatus references(CMPIAssociationMI*, const CMPIContext*, const CMPIResult* 
     return kit::ok;
 }
 
-CMPIStatus referenceNames(CMPIAssociationMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*, const char*,
-                          const char*) {
-    return {CMPI_RC_ERR_NOT_SUPPORTED, nullptr};
-}
-
 CMPIAssociationMIFT associationTable{CMPIVersion200, CMPIVersion200,  "associationSample", associationCleanup,
-                                     associators,    associatorNames, references,          referenceNames};
+                                     associators,    associatorNames, references,          kit::noReferenceNames};
 CMPIAssociationMI associationMI{nullptr, &associationTable};
 
 }  // namespace
 
 KIT_EXPORT CMPIInstanceMI* Sample_Create_InstanceMI(const CMPIBroker* itsBroker, const CMPIContext*, CMPIStatus*) {
-    kit::keep(broker, itsBroker);
+    kit::store(broker, itsBroker);
     kit::log(broker, "instance factory");
     return &instanceMI;
 }
 
 KIT_EXPORT CMPIAssociationMI* Sample_Create_AssociationMI(const CMPIBroker* itsBroker, const CMPIContext*,
                                                           CMPIStatus*) {
-    kit::keep(broker, itsBroker);
+    kit::store(broker, itsBroker);
     kit::log(broker, "association factory");
     return &associationMI;
 }

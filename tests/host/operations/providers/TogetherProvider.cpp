@@ -3,7 +3,7 @@
 
 #include "ProviderKit.h"
 
-// A provider whose factory comes back once two of its calls are inside at a time.
+// A provider whose factory returns after it is called a second time concurrently.
 
 namespace {
 
@@ -11,18 +11,15 @@ std::mutex mutex;
 std::condition_variable changed;
 int inside = 0;
 
-CMPIStatus cleanup(CMPIInstanceMI*, const CMPIContext*, CMPIBoolean) {
-    return kit::ok;
-}
-
 CMPIStatus enumerateInstances(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*,
                               const char**) {
     return kit::ok;
 }
 
-CMPIInstanceMIFT table{
-    CMPIVersion200, CMPIVersion200, "instanceTogether", cleanup, nullptr, enumerateInstances, nullptr, nullptr, nullptr,
-    nullptr,        nullptr};
+CMPIInstanceMIFT table{CMPIVersion200, CMPIVersion200, "instanceTogether",
+                       kit::cleanup,   nullptr,        enumerateInstances,
+                       nullptr,        nullptr,        nullptr,
+                       nullptr,        nullptr};
 CMPIInstanceMI interface { nullptr, &table };
 
 }  // namespace

@@ -1,0 +1,27 @@
+#pragma once
+
+#include "support/AgentConfiguration.h"
+
+#include <string>
+
+namespace providerTest {
+
+/** Replaces the nodes of this process's agent while it exists. The program must link koframework_objects. */
+class ProcessNodes {
+public:
+    explicit ProcessNodes(const std::string& toml);
+    ~ProcessNodes();
+    ProcessNodes(const ProcessNodes&) = delete;
+    ProcessNodes& operator=(const ProcessNodes&) = delete;
+
+private:
+    agentEnvironment::AgentNodes configuration;
+};
+
+/** @name Nodes as TOML fragments */
+///@{
+extern const char* const assetNodes;    ///< computers with every form of product name
+extern const char* const settingNodes;  ///< computers whose paths contain escaped characters, and two of one name
+///@}
+
+}  // namespace providerTest
