@@ -84,57 +84,33 @@ def table(head, rows):
     return "\n".join(lines) + "\n"
 
 
-def counts_of(operation, class_name, size):
-    """The kept instructions of both sides; nothing where they are not counted."""
-    kept = json.loads(INSTRUCTIONS.read_text(encoding="utf-8"))
-    names = [f"{operation}/{class_name}/{side}/{size}" for side in SIDES]
-    return [kept[name] for name in names] if names[0] in kept else []
+def table_by_size(cases, cell, head):
+    """A row per request and class, a column per number of records: what `cell` makes of each measured case."""
+    sizes = sorted({size for by_size in cases.values() for size in by_size})
+    rows = [[operation, class_name, *(cell(by_size[size]) if size in by_size else "" for size in sizes)]
+            for (operation, class_name), by_size in cases.items()]
+    return table([*head, *(f"{size:,}" for size in sizes)], rows)
 
 
-def requests_table(cases):
-    """One row a request, class and size: times, and instructions where they are counted."""
-    rows = []
-    for (operation, class_name), by_size in cases.items():
-        for size, times in sorted(by_size.items()):
-            counts = counts_of(operation, class_name, size)
-            own = [f"{(counts[0] - counts[1]) / size:,.0f}" if counts else ""]
-            rows.append([operation, class_name, f"{size:,}", *(time_text(times[side]) for side in SIDES),
-                         ratio_text(times), *([f"{count:,}" for count in counts] or ["", ""]), *own])
-    return table(["Request", "Class", "Records", "Provider", "Floor", "Ratio", "Instructions", "of the floor",
-                  "own, per record"], rows)
+def requests_tables(cases):
+    """Times of the provider, with their ratio to the floor's: first of the requests that were measured at several sizes."""
+    def cell(times):
+        return f"{time_text(times['provider'])} ({ratio_text(times)})"
+    several = {case: by_size for case, by_size in cases.items() if len(by_size) > 1}
+    rows = [[operation, class_name, f"{size:,}", cell(times)] for (operation, class_name), by_size in cases.items()
+            if len(by_size) == 1 for size, times in by_size.items()]
+    return (table_by_size(several, cell, ["Request", "Class"]) + "\n" +
+            table(["Request", "Class", "Records", "Time"], rows))
 
 
 def gate_table(cases):
-    """What the gate adds, one row a case and size that was measured with it."""
-    rows = []
-    for (operation, class_name), by_size in cases.items():
-        for size, times in sorted(by_size.items()):
-            if "gated" in times:
-                added = times["gated"] - times["alone"]
-                rows.append([operation, class_name, f"{size:,}", time_text(times["alone"]), time_text(times["gated"]),
-                             f"{added / 1e3:+.1f} µs", f"{added / times['alone']:+.1%}"])
-    return table(["Request", "Class", "Records", "Alone", "Behind the gate", "Added", "Share"], rows)
-
-
-def growth_cells(by_size, side):
-    """Time a record in both tables, and its growth; nothing where a difference is lost in what it is taken from."""
-    times = [time_a_record(by_size, side, size) for size in (10000, 1000000)]
-    if min(times) < 0.05 * time_a_record(by_size, "provider", 10000):
-        return ["", "", ""]
-    return [*map(time_text, times), f"{growth(by_size, side):.2f}"]
-
-
-def growth_table(cases):
-    """Time a record with the largest table over that with 10,000 records."""
-    rows = []
-    for (operation, class_name), by_size in cases.items():
-        largest = max(by_size)
-        if largest > 100000:
-            cells = [cell for side in (*SIDES, "own") for cell in growth_cells(by_size, side)]
-            rows.append([operation, class_name, *cells])
-    head = ["with 10,000", "with 1,000,000", "growth"]
-    return table(["Request", "Class", *head, f"floor: {head[0]}", *head[1:], f"provider's own: {head[0]}", *head[1:]],
-                 rows)
+    """The time that the gate adds, and its share of the request's time without the gate."""
+    def cell(times):
+        added = times["gated"] - times["alone"]
+        return f"{added / 1e3:+.1f} µs ({added / times['alone']:+.1%})"
+    gated = {case: {size: times for size, times in by_size.items() if "gated" in times}
+             for case, by_size in cases.items()}
+    return table_by_size({case: by_size for case, by_size in gated.items() if by_size}, cell, ["Request", "Class"])
 
 
 def memories(results):
@@ -157,15 +133,9 @@ def memory_table(results):
                   "of that its strings", "also reserved", "Ratio of memory to file"], rows)
 
 
-def time_a_record(by_size, side, size):
-    """Nanoseconds; of the side "own" what the provider takes besides the floor."""
-    times = by_size[size]
-    return (times["provider"] - times["floor"] if side == "own" else times[side]) / size
-
-
 def growth(by_size, side="provider"):
-    """Time a record of 1,000,000 over that of 10,000."""
-    return time_a_record(by_size, side, 1000000) / time_a_record(by_size, side, 10000)
+    """Time per record with 1,000,000 records, relative to 10,000."""
+    return by_size[1000000][side] / 1000000 / (by_size[10000][side] / 10000)
 
 
 class Limit:
@@ -242,11 +212,10 @@ def figures(cases, limits, results):
         "## Limits\n",
         limits_table(limits),
         "## Requests\n",
-        requests_table(cases),
-        "## The provider alone and behind the gate\n",
+        "Time of the provider by number of records; in parentheses its ratio to the floor's.\n",
+        requests_tables(cases),
+        "## Time that the gate adds\n",
         gate_table(cases),
-        "## Time per record with 1,000,000 records\n",
-        growth_table(cases),
         "## Memory of the loaded records\n",
         memory_table(results),
     ])
