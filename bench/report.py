@@ -1,12 +1,12 @@
 #!/usr/bin/env python3
-"""Runs the benchmarks and writes their figures, docs/performance-figures.md, and the picture docs/performance.svg.
+"""Runs the benchmarks and writes docs/performance-figures.md and the picture docs/performance.svg.
 
 usage: bench/report.py BUILD_DIRECTORY [--min-time SECONDS] [--runs N] [--print]
 
 gnuplot draws the picture (Debian package gnuplot-nox).
 
-With --print the figures go to standard output, and no file is written. Nothing is written unless every
-benchmark ran and every answer was right. A limit that can be kept, and was missed, is a failure.
+With --print, prints the figures and writes no file. Writes nothing unless every benchmark ran and every answer was
+right. Fails if a reachable limit was missed.
 """
 
 import argparse
@@ -25,9 +25,9 @@ PLOTTED = ("Load", "EnumInstances", "EnumInstanceNames", "GetInstance.middle", "
 PLOTTED_CLASS = "VELKO_Lease"
 HEAD = "<!-- Written by script/benchmark. -->\n\n# Performance figures\n\n"
 SIDES = ("provider", "floor")
-# Loading is timed by itself, all else with the floor in turn.
+# Loading is timed separately, other requests alternately with the floor.
 TIMED = "^Load/|/both/|/gate/"
-# What is to take no longer a record in the largest table: what it is called, the operation, what bounds it.
+# Limits of the time per record in the largest table: name, operation, and the work that determines the time.
 LARGEST = (("Enumerating leases", "EnumInstances", "the object manager's instances"),
            ("Enumerating their names", "EnumInstanceNames", "the object manager's paths"),
            ("Loading leases", "Load", "reading the file"),
@@ -35,7 +35,7 @@ LARGEST = (("Enumerating leases", "EnumInstances", "the object manager's instanc
 
 
 def run(program, min_time):
-    """The result of the benchmark program as Google Benchmark's JSON."""
+    """Returns the result of the benchmark program, which is Google Benchmark's JSON."""
     command = [program, "--benchmark_format=json", f"--benchmark_min_time={min_time}", f"--benchmark_filter={TIMED}"]
     done = subprocess.run(command, stdout=subprocess.PIPE, text=True, check=False)
     if done.returncode != 0:
@@ -44,9 +44,9 @@ def run(program, min_time):
 
 
 def measured(results):
-    """{(operation, class): {size: {side: nanoseconds}}}, in the order of the program; of several runs the best time.
+    """Returns {(operation, class): {size: {side: nanoseconds}}} in the order of the program: the best time of the runs.
 
-    Where the gate was measured, the sides "alone" and "gated" are the two that were measured in turn.
+    The sides "alone" and "gated" are measured alternately, where the gate is measured.
     """
     cases = {}
     units = {"ns": 1, "us": 1e3, "ms": 1e6, "s": 1e9}
@@ -85,7 +85,7 @@ def table(head, rows):
 
 
 def table_by_size(cases, cell, head):
-    """A row per request and class, a column per number of records: what `cell` makes of each measured case."""
+    """Returns a table with a row per request and class and a column per number of records. `cell` formats the times."""
     sizes = sorted({size for by_size in cases.values() for size in by_size})
     rows = [[operation, class_name, *(cell(by_size[size]) if size in by_size else "" for size in sizes)]
             for (operation, class_name), by_size in cases.items()]
@@ -93,7 +93,7 @@ def table_by_size(cases, cell, head):
 
 
 def requests_tables(cases):
-    """Times of the provider, with their ratio to the floor's: first of the requests that were measured at several sizes."""
+    """Returns two tables of the provider's times and their ratio to the floor's: for several sizes, and for one size."""
     def cell(times):
         return f"{time_text(times['provider'])} ({ratio_text(times)})"
     several = {case: by_size for case, by_size in cases.items() if len(by_size) > 1}
@@ -104,7 +104,7 @@ def requests_tables(cases):
 
 
 def gate_table(cases):
-    """The time that the gate adds, and its share of the request's time without the gate."""
+    """Returns the time that the gate adds, and its share of the request's time without the gate."""
     def cell(times):
         added = times["gated"] - times["alone"]
         return f"{added / 1e3:+.1f} µs ({added / times['alone']:+.1%})"
@@ -114,7 +114,7 @@ def gate_table(cases):
 
 
 def memories(results):
-    """(class, size, counters) of each loading of a table that is large enough to have pages of its own."""
+    """Yields (class, size, counters) of each loaded table that is large enough for separate memory pages."""
     for one in results[-1]["benchmarks"]:
         operation, class_name, side, size = one["name"].split("/")[:4]
         if (operation, side) == ("Load", "provider") and int(size) >= 10000:
@@ -122,7 +122,7 @@ def memories(results):
 
 
 def memory_table(results):
-    """The table has room for more records than there are; the pages of that room are not in use."""
+    """Returns the memory per record. The table reserves room for more records, whose pages are not in use."""
     rows = []
     for class_name, size, one in memories(results):
         memory, text, pieces = one["bytes_per_record"], one["text_per_record"], one["pieces_per_record"]
@@ -134,12 +134,12 @@ def memory_table(results):
 
 
 def growth(by_size, side="provider"):
-    """Time per record with 1,000,000 records, relative to 10,000."""
+    """Returns the time per record with 1,000,000 records, relative to 10,000."""
     return by_size[1000000][side] / 1000000 / (by_size[10000][side] / 10000)
 
 
 class Limit:
-    """What the provider or the gate is to keep to, what was measured, and whether it is in their hands."""
+    """A limit, the measured value, and whether it is reachable."""
 
     def __init__(self, what, measured_here, at_most, bound, is_reachable=True):
         self.what, self.measured, self.at_most, self.bound = what, measured_here, at_most, bound
@@ -180,7 +180,7 @@ def limits_table(limits):
 
 
 def draw(cases):
-    """Draws the time a record of some requests, provider and floor, over the number of records."""
+    """Draws the time per record of some requests, of provider and floor, over the number of records."""
     columns = [cases[(operation, PLOTTED_CLASS)] for operation in PLOTTED]
     lines = []
     for size in sorted({size for by_size in columns for size in by_size}):
