@@ -93,7 +93,7 @@ def table_by_size(cases, cell, head):
 
 
 def requests_tables(cases):
-    """Returns two tables of the provider's times and their ratio to the floor's: for several sizes, and for one size."""
+    """Returns two tables of the provider's times and their ratio to the floor's: for several sizes and for one."""
     def cell(times):
         return f"{time_text(times['provider'])} ({ratio_text(times)})"
     several = {case: by_size for case, by_size in cases.items() if len(by_size) > 1}
