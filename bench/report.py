@@ -1,12 +1,12 @@
 #!/usr/bin/env python3
-"""Runs the benchmarks and writes docs/performance-figures.md and docs/performance.svg.
+"""Runs the benchmarks and writes docs/performance-figures.md and the picture docs/performance.svg.
 
 usage: bench/report.py BUILD_DIRECTORY [--min-time SECONDS] [--runs N] [--print]
 
 gnuplot draws the picture (Debian package gnuplot-nox).
 
-With --print, the figures are printed, and no file is written. Nothing is written unless all benchmarks
-ran and all responses were right. A limit that can be kept, and was missed, is a failure.
+With --print, prints the figures and writes no file. Writes nothing unless every benchmark ran and every answer was
+right. Fails if a reachable limit was missed.
 """
 
 import argparse
@@ -25,9 +25,9 @@ PLOTTED = ("Load", "EnumInstances", "EnumInstanceNames", "GetInstance.middle", "
 PLOTTED_CLASS = "VELKO_Lease"
 HEAD = "<!-- Written by script/benchmark. -->\n\n# Performance figures\n\n"
 SIDES = ("provider", "baseline")
-# Loading is timed separately; all other requests alternate with the baseline.
+# Loading is timed separately, other requests alternately with the baseline.
 TIMED = "^Load/|/both/|/gate/"
-# Operations whose time per record is limited in the largest table: name, operation, what bounds it.
+# Limits of the time per record in the largest table: name, operation, and the work that determines the time.
 LARGEST = (("Enumerating leases", "EnumInstances", "the object manager's instances"),
            ("Enumerating their names", "EnumInstanceNames", "the object manager's paths"),
            ("Loading leases", "Load", "reading the file"),
@@ -35,7 +35,7 @@ LARGEST = (("Enumerating leases", "EnumInstances", "the object manager's instanc
 
 
 def run(program, min_time):
-    """The result of the benchmark program, as JSON of Google Benchmark."""
+    """Returns the result of the benchmark program, which is Google Benchmark's JSON."""
     command = [program, "--benchmark_format=json", f"--benchmark_min_time={min_time}", f"--benchmark_filter={TIMED}"]
     done = subprocess.run(command, stdout=subprocess.PIPE, text=True, check=False)
     if done.returncode != 0:
@@ -44,9 +44,9 @@ def run(program, min_time):
 
 
 def measured(results):
-    """{(operation, class): {size: {side: nanoseconds}}}, in the order of the program; of several runs, the best time.
+    """Returns {(operation, class): {size: {side: nanoseconds}}} in the order of the program: the best time of the runs.
 
-    The sides of a measurement of the gate are "alone" and "gated".
+    The sides "alone" and "gated" are measured alternately, where the gate is measured.
     """
     cases = {}
     units = {"ns": 1, "us": 1e3, "ms": 1e6, "s": 1e9}
@@ -62,7 +62,7 @@ def measured(results):
     for case, sizes in cases.items():
         for size, times in sizes.items():
             if not set(SIDES) <= set(times):
-                sys.exit(f"{case} with {size} records does not have both sides")
+                sys.exit(f"{case} with {size} records has not both sides")
     return cases
 
 
@@ -84,61 +84,40 @@ def table(head, rows):
     return "\n".join(lines) + "\n"
 
 
-def counts_of(operation, class_name, size):
-    """The stored instructions of both sides; nothing if they are not counted."""
-    kept = json.loads(INSTRUCTIONS.read_text(encoding="utf-8"))
-    names = [f"{operation}/{class_name}/{side}/{size}" for side in SIDES]
-    return [kept[name] for name in names] if names[0] in kept else []
+def table_by_size(cases, cell, head):
+    """Returns a table with a row per request and class and a column per number of records. `cell` formats the times."""
+    sizes = sorted({size for by_size in cases.values() for size in by_size})
+    rows = [[operation, class_name, *(cell(by_size[size]) if size in by_size else "" for size in sizes)]
+            for (operation, class_name), by_size in cases.items()]
+    return table([*head, *(f"{size:,}" for size in sizes)], rows)
 
 
-def requests_table(cases):
-    """One row per request, class and size: times, and instructions if they are counted."""
-    rows = []
-    for (operation, class_name), by_size in cases.items():
-        for size, times in sorted(by_size.items()):
-            counts = counts_of(operation, class_name, size)
-            own = [f"{(counts[0] - counts[1]) / size:,.0f}" if counts else ""]
-            rows.append([operation, class_name, f"{size:,}", *(time_text(times[side]) for side in SIDES),
-                         ratio_text(times), *([f"{count:,}" for count in counts] or ["", ""]), *own])
-    return table(["Request", "Class", "Records", "Provider", "Baseline", "Ratio", "Instructions", "of the baseline",
-                  "own, per record"], rows)
+def requests_tables(cases):
+    """Returns two tables of the provider's times and their ratio to the baseline's: for several sizes and for one."""
+    def cell(times):
+        return f"{time_text(times['provider'])} ({ratio_text(times)})"
+    several = {case: by_size for case, by_size in cases.items() if len(by_size) > 1}
+    rows = [[operation, class_name, f"{size:,}", cell(times)] for (operation, class_name), by_size in cases.items()
+            if len(by_size) == 1 for size, times in by_size.items()]
+    return (table_by_size(several, cell, ["Request", "Class"]) + "\n" +
+            table(["Request", "Class", "Records", "Time"], rows))
 
 
 def gate_table(cases):
-    """What the gate adds, one row per case and size."""
-    rows = []
-    for (operation, class_name), by_size in cases.items():
-        for size, times in sorted(by_size.items()):
-            if "gated" in times:
-                added = times["gated"] - times["alone"]
-                rows.append([operation, class_name, f"{size:,}", time_text(times["alone"]), time_text(times["gated"]),
-                             f"{added / 1e3:+.1f} µs", f"{added / times['alone']:+.1%}"])
-    return table(["Request", "Class", "Records", "Alone", "Behind the gate", "Added", "Share"], rows)
+    """Returns the time that the gate adds, and its share of the request's time without the gate.
 
-
-def growth_cells(by_size, side):
-    """Time per record in both tables, and its growth; nothing if the difference of two times is too small."""
-    times = [time_per_record(by_size, side, size) for size in (10000, 1000000)]
-    if min(times) < 0.05 * time_per_record(by_size, "provider", 10000):
-        return ["", "", ""]
-    return [*map(time_text, times), f"{growth(by_size, side):.2f}"]
-
-
-def growth_table(cases):
-    """Time per record in the largest table, relative to 10,000 records."""
-    rows = []
-    for (operation, class_name), by_size in cases.items():
-        largest = max(by_size)
-        if largest > 100000:
-            cells = [cell for side in (*SIDES, "own") for cell in growth_cells(by_size, side)]
-            rows.append([operation, class_name, *cells])
-    head = ["with 10,000", "with 1,000,000", "growth"]
-    return table(["Request", "Class", *head, f"baseline: {head[0]}", *head[1:], f"provider's own: {head[0]}", *head[1:]],
-                 rows)
+    Leaves out the first and last record: the position does not change what the gate adds.
+    """
+    def cell(times):
+        added = times["gated"] - times["alone"]
+        return f"{added / 1e3:+.1f} µs ({added / times['alone']:+.1%})"
+    gated = {case: {size: times for size, times in by_size.items() if "gated" in times}
+             for case, by_size in cases.items() if not case[0].endswith((".first", ".last"))}
+    return table_by_size({case: by_size for case, by_size in gated.items() if by_size}, cell, ["Request", "Class"])
 
 
 def memories(results):
-    """(class, size, counters) of each loading of a table that is large enough to be mapped separately."""
+    """Yields (class, size, counters) of each loaded table that is large enough for separate memory pages."""
     for one in results[-1]["benchmarks"]:
         operation, class_name, side, size = one["name"].split("/")[:4]
         if (operation, side) == ("Load", "provider") and int(size) >= 10000:
@@ -146,10 +125,10 @@ def memories(results):
 
 
 def memory_table(results):
-    """The table reserves memory for more records; the pages of that memory are not resident."""
+    """Returns the memory per record. The table reserves room for more records, whose pages are not in use."""
     rows = []
     for class_name, size, one in memories(results):
-        memory, text, pieces = one["bytes_per_record"], one["file_per_record"], one["pieces_per_record"]
+        memory, text, pieces = one["bytes_per_record"], one["text_per_record"], one["pieces_per_record"]
         record = memory - pieces
         cells = (text, memory, record, pieces, one["table_per_record"] - record)
         rows.append([class_name, f"{size:,}", *(f"{cell:.0f}" for cell in cells), f"{memory / text:.2f}"])
@@ -157,19 +136,13 @@ def memory_table(results):
                   "of that its strings", "also reserved", "Ratio of memory to file"], rows)
 
 
-def time_per_record(by_size, side, size):
-    """Nanoseconds; of the side "own", the provider's without the baseline's."""
-    times = by_size[size]
-    return (times["provider"] - times["baseline"] if side == "own" else times[side]) / size
-
-
 def growth(by_size, side="provider"):
-    """Time per record with 1,000,000 records, relative to 10,000."""
-    return time_per_record(by_size, side, 1000000) / time_per_record(by_size, side, 10000)
+    """Returns the time per record with 1,000,000 records, relative to 10,000."""
+    return by_size[1000000][side] / 1000000 / (by_size[10000][side] / 10000)
 
 
 class Limit:
-    """A limit of the provider or the gate, and the measured figure."""
+    """A limit, the measured value, and whether it is reachable."""
 
     def __init__(self, what, measured_here, at_most, bound, is_reachable=True):
         self.what, self.measured, self.at_most, self.bound = what, measured_here, at_most, bound
@@ -192,7 +165,7 @@ def limits_of(cases, results):
                      f"{bound}; the baseline: {growth(leases[operation], 'baseline'):.2f}")
                for what, operation, bound in LARGEST]
     limits += [Limit(f"Memory of {class_name} among 10,000, relative to its size in the file",
-                     one["bytes_per_record"] / one["file_per_record"], 2,
+                     one["bytes_per_record"] / one["text_per_record"], 2,
                      "the record layout, and one allocation per longer string", False)
                for class_name, size, one in memories(results) if size == 10000]
     limits += [Limit("Gate, enumerating 1,000 leases: added time in percent", 100 * gated, 5,
@@ -210,7 +183,7 @@ def limits_table(limits):
 
 
 def draw(cases):
-    """Draws the time per record of some requests, provider and baseline, over the number of records."""
+    """Draws the time per record of some requests, of provider and baseline, over the number of records."""
     columns = [cases[(operation, PLOTTED_CLASS)] for operation in PLOTTED]
     lines = []
     for size in sorted({size for by_size in columns for size in by_size}):
@@ -242,11 +215,10 @@ def figures(cases, limits, results):
         "## Limits\n",
         limits_table(limits),
         "## Requests\n",
-        requests_table(cases),
-        "## The provider alone and behind the gate\n",
+        "Time of the provider by number of records; in parentheses its ratio to the baseline's.\n",
+        requests_tables(cases),
+        "## Time that the gate adds\n",
         gate_table(cases),
-        "## Time per record with 1,000,000 records\n",
-        growth_table(cases),
         "## Memory of the loaded records\n",
         memory_table(results),
     ])
@@ -256,10 +228,10 @@ def main():
     parser = argparse.ArgumentParser(description="Runs the benchmarks and reports their figures.")
     parser.add_argument("build_directory", type=pathlib.Path)
     parser.add_argument("--min-time", type=float, default=0.1, metavar="SECONDS",
-                        help="shortest time of each benchmark")
+                        help="how long each benchmark runs at least")
     parser.add_argument("--runs", type=int, default=1, metavar="N",
-                        help="number of runs; the best time of each is used")
-    parser.add_argument("--print", action="store_true", help="print the figures and write no file")
+                        help="how often everything is run; the best time of each is kept")
+    parser.add_argument("--print", action="store_true", help="leave the document alone")
     arguments = parser.parse_args()
     program = arguments.build_directory / "bin" / "provider_benchmark"
     results = [run(program, arguments.min_time) for _ in range(arguments.runs)]

@@ -108,8 +108,8 @@ function(law_install_overrides component name)
 endfunction()
 
 law_package(provider lease-warranty-provider
-    DOCUMENTS architecture.md architecture.svg classes.md data-files.md gate.md log-records.md messages.md
-        object-managers.md performance.md performance-figures.md performance.svg security.md ../README.md
+    DOCUMENTS architecture.md architecture.svg classes.md data-files.md gate.md lease-warranty-register.md log-records.md
+        messages.md object-managers.md performance.md performance-figures.md performance.svg security.md ../README.md
     DEPENDS "ostrel-reference-agent (>= ${PROJECT_VERSION}) | ostrel-agent"
     DESCRIPTION "CMPI provider for the leases and warranties of a computer
 A library that a CIM object manager (SFCB, OpenPegasus) loads, and that

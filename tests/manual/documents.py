@@ -35,13 +35,18 @@ def all_blocks(language=None, mark=None):
 
 
 def rows(document, heading=""):
-    """Returns the rows of the tables below a heading, or of all tables, as lists of cells without backquotes."""
+    """Returns the rows of tables that begin with code, below a heading or all, as lists of cells without backquotes."""
     text = document.read_text("utf-8")
     if heading:
         text = re.split(rf"^#+ {re.escape(heading)}$", text, 1, re.M)[1]
         text = re.split(r"^#", text, 1, re.M)[0]
     lines = re.findall(r"^\| (`.*) \|$", text, re.M)
-    return [[cell.replace("`", "") for cell in line.split(" | ")] for line in lines]
+    return [[cell.strip().replace("`", "") for cell in line.split("|")] for line in lines]
+
+
+def options(document):
+    """Returns the options that tables document, with their dashes."""
+    return {option for row in rows(document) for option in re.findall(r"(?:^|, )(--?[a-z][a-z-]*)", row[0])}
 
 
 def without_tested_blocks(document):
