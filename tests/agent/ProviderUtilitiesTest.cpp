@@ -166,7 +166,7 @@ TEST_F(ProviderUtilitiesTest, SetDateTimesFromStrings) {
         const cimhost::Value value = onlyProperty(object);
         EXPECT_EQ(value.type, CMPI_dateTime);
         ASSERT_FALSE(value.isNull) << date;
-        EXPECT_EQ(std::get<cimhost::DateTime>(value.elements.front()).text, date);
+        EXPECT_EQ(std::get<cimhost::DateTime>(value.elements.front()).value, date);
     }
 }
 
