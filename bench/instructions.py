@@ -77,7 +77,7 @@ def count(program, request, function):
 
 
 def added_by_gate(gated, all_calls, baseline):
-    """What the gate adds to a request: the instructions behind the gate minus those of the provider alone."""
+    """Returns the instructions that the gate adds to a request: those behind the gate minus those of the provider alone."""
     return (gated - (all_calls - gated - baseline)) // GATE_TURNS
 
 

@@ -21,7 +21,7 @@ struct Computer {
 /** The two ends of an association. */
 struct AssociationPair {
     Computer computer;
-    const CMPIObjectPath* element;  ///< what belongs to the computer
+    const CMPIObjectPath* element;  ///< belongs to the computer
 };
 
 using Pairs = std::vector<AssociationPair>;

@@ -18,7 +18,7 @@ public:
     /**
      * Connects the provider to a broker, which from then on serves all requests. Opens the request lock if it was
      * closed. Returns at once if the broker and its tables are those of the last call: managers call factories often,
-     * maybe with a lock of their own held, and must not have to wait for requests then.
+     * possibly while they hold a lock, and must not wait for requests.
      * @throws ManagerGone if the object manager or the process is shutting down
      */
     void connect(const CMPIBroker* manager);

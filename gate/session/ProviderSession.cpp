@@ -123,7 +123,7 @@ const CMPIInstance* ProviderSession::find(const LocalObjectPath& path, const Cla
     return result.instances.empty() ? nullptr : result.instances.front();
 }
 
-/** Tells an error of the provider from an instance that does not exist: it ends neither answer. */
+/** Whether an instance exists: the provider completes its response neither after an error nor for a missing one. */
 bool ProviderSession::isListed(const LocalObjectPath& path, const Class& owner) const {
     const Paths listed = names(LocalObjectPath(nameSpaceOf(path.handle()), owner));
     return std::any_of(listed.begin(), listed.end(), [&](const auto* each) { return samePath(each, path.handle()); });

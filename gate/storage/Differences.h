@@ -2,7 +2,7 @@
 
 #include "RoundTrip.h"
 
-// What a change of values means for the instance, the provider and the data file.
+// The effects of a change of values on the instance, the provider and the data file.
 
 namespace gate {
 

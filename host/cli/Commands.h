@@ -15,7 +15,7 @@ struct CommandResult {
     std::string output{};   ///< for standard output
     Status status{};        ///< of the request
     std::string failure{};  ///< message for standard error if the status is OK; empty: none
-    std::string hint{};     ///< what to do after a failed request; empty: none
+    std::string hint{};     ///< advice after a failed request; empty: none
 };
 
 /** Additions of a program to the commands of cimhost. */

@@ -1,1 +1,1 @@
-// Stands for the headers that all tests share: see tests/CMakeLists.txt.
+// Source of the target that precompiles the headers of all tests; see tests/CMakeLists.txt.

@@ -86,7 +86,7 @@ void requireFunction(const std::string& function);
 /** Names of all functions that are recorded, once the first tables were made. */
 const std::set<std::string>& recordedFunctions();
 
-/** Function tables are told apart by the pointer that every handle has to its table. */
+/** The pointer to its function table identifies the type of a handle. */
 template <class Handle>
 const void* tableOf(const Handle* handle) {
     if constexpr (std::is_same_v<Handle, CMPIBroker>) {
@@ -123,7 +123,7 @@ inline const void* tableOfCall() {
     return nullptr;
 }
 
-/** As brokers do, a call that fails tells why in words. */
+/** As in brokers, the status of a failed call has a message. */
 inline CMPIStatus injectedStatus(CMPIrc rc) {
     return cimhost::toCmpi({rc, rc == CMPI_RC_OK ? std::string{} : "ordered by the test"});
 }

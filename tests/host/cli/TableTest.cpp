@@ -12,7 +12,7 @@ using text::columnsOf;
 constexpr auto wide = "\u65E5\u672C";     // two letters of two columns each
 constexpr auto accented = "e\u0301";      // a letter and the accent above it
 constexpr auto composed = "\u00E9";       // the same in one
-constexpr auto broken = "\xE6\x97 \xFF";  // a character that breaks off, a blank, no character
+constexpr auto broken = "\xE6\x97 \xFF";  // an incomplete character, a blank, an invalid byte
 
 TEST(Columns, AreThoseThatATerminalGives) {
     EXPECT_EQ(columnsOf(""), 0U);

@@ -4,7 +4,7 @@
 #include "OperationsFixture.h"
 #include "lab/emulation/ManagerEmulation.h"
 
-// Many clients at a time, as every manager: providers are started, ask each other, fail and throw, and every client
+// Concurrent clients, under each manager: providers are started, call each other, fail and throw, and every client
 // receives the responses to its own requests.
 
 namespace {

@@ -25,7 +25,7 @@ protected:
         add("Sample_Link", "Sample", "SampleProvider", true, true);
         add("Sample_OtherLink", "Sample", "SampleProvider", false, true);
         add("Other_Thing", "Anything", "OtherProvider", true, false);
-        add("Unloadable", "Nobody", "DoesNotExist", true, false);
+        add("Unloadable", "Absent", "DoesNotExist", true, false);
     }
 
     void add(const char* className, const char* provider, const char* location, bool instance, bool association) {
@@ -66,7 +66,7 @@ protected:
     std::string awaited;               ///< the message at which whenLogged is called, once
     std::function<void()> whenLogged;  ///< called inside the provider's call
 
-    std::vector<std::string> log;  ///< what providers logged; outlives the manager, whose end is logged too
+    std::vector<std::string> log;  ///< log of the providers; outlives the manager, whose end is logged too
     cimhost::ObjectManagerOptions options;
     cimhost::ProviderRegistry registry;
     std::unique_ptr<cimhost::ObjectManager> started;

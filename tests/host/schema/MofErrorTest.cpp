@@ -35,7 +35,7 @@ std::string nameOf(const testing::TestParamInfo<BadMof>& info) {
 const BadMof syntax[] = {
     {"NoDeclaration", "klass C {};", "1:1", "expected #pragma, \"qualifier\", \"class\""},
     {"NoClassName", "class {};", "1:7", "expected a class name"},
-    {"NoBody", "class C;", "1:8", "expected {"},
+    {"MissingBody", "class C;", "1:8", "expected {"},
     {"NoSemicolonAfterClass", "class C {}\nclass D {};", "2:1", "expected ;"},
     {"NoSemicolonAfterProperty", "class C {\n  string A\n  string B;\n};", "3:3", "expected ;"},
     {"NoPropertyName", "class C { string ; };", "1:18", "expected the name of a property"},

@@ -28,7 +28,7 @@ const char* nameOf(Manager manager);
 /** The manager of that name; none for another name. */
 std::optional<Manager> managerNamed(std::string_view name);
 
-/** What the manager does differently from the standard; for Manager::standard, the standard behaviour. */
+/** The manager's differences from the standard; for Manager::standard, the standard behaviour. */
 std::shared_ptr<const ManagerBehaviour> emulationOf(Manager manager);
 
 /** Gives tables the versions and gaps of the manager's. */

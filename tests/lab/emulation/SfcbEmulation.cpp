@@ -81,7 +81,7 @@ FunctionTables sfcbTables() {
     return tables;
 }
 
-/** SFCB runs providers in processes of their own, which an exception or a wrong result may end. */
+/** SFCB runs providers in separate processes, which an exception or a wrong result may end. */
 class SfcbEmulation : public ManagerBehaviour {
 public:
     const FunctionTables& tables() const override {

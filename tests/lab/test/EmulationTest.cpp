@@ -24,7 +24,7 @@ class EmulationTest : public OperationsTest {
 protected:
     EmulationTest() {
         registry = {};
-        add("Unloadable", "Nobody", "DoesNotExist", true, false);
+        add("Unloadable", "Absent", "DoesNotExist", true, false);
         for (const char* className :
              {"Echo_Seen", "Echo_Thing", "Echo_Broker", "Echo_Thread", "Echo_Calls", "Echo_Throwing",
               "Echo_ReturnsInstance", "Echo_ReturnsBoth", "Echo_ReturnsNothing", "Echo_ReleasesPath"}) {
@@ -181,7 +181,7 @@ TEST_F(EmulationTest, AnInstanceFromACreationIsAcceptedMisreadOrRejected) {
     EXPECT_EQ(seen(), "instance 0");
     as(Manager::sfcb);
     const auto misread = create("Echo_ReturnsInstance");
-    EXPECT_TRUE(misread.ok()) << "the client is told that all is well";
+    EXPECT_TRUE(misread.ok()) << "the client receives a success";
     EXPECT_EQ(misread.path().className, "root/cimv2");
     EXPECT_TRUE(misread.path().keys.empty());
     EXPECT_EQ(seen(), "instance 0");

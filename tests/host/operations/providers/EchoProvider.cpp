@@ -135,7 +135,7 @@ CMPIStatus enumerateInstances(CMPIInstanceMI*, const CMPIContext* context, const
     return kit::ok;
 }
 
-/** Returns an instance of the path's name, if that is "there"; tells how returnDone was taken. */
+/** Returns an instance of the path's name if that is "there", and reports the status of returnDone. */
 CMPIStatus getInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult* result, const CMPIObjectPath* path,
                        const char** properties) {
     if (kit::key(path, "Name") == "there") {

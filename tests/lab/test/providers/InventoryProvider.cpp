@@ -87,7 +87,7 @@ Store shownBy(const std::string& asked) {
     if (asked == "Inventory_Forgetful") {
         shown.clear();
     } else if (isDefective(asked, "Inventory_Inventive")) {
-        shown["nobody's"] = {};
+        shown["no manager's"] = {};
     } else if (isDefective(asked, "Inventory_Nameless")) {
         shown[""] = {};
     }
