@@ -87,25 +87,30 @@ shell_scripts() {
         FNR == 2 { nextfile }'
 }
 
-# test_programs PRESET [WRAPPER...]: runs each test program of a built preset in one process, under the
-# wrapper. script/test uses a process per test, which takes too long if processes start slowly.
+# test_programs PRESET [WRAPPER...]: runs the test programs of a built preset under the wrapper. A program with many tests
+# is divided into shards, one process each. script/test uses a process per test, which takes too long if processes start
+# slowly.
 test_programs() {
     local preset=$1 directory=build/programs-$1
     shift
     mkdir -p "$directory"
     ctest --preset "$preset" --show-only=json-v1 | python3 -c '
-import json, sys
+import collections, json, sys
 
 build, wrapper = sys.argv[1], sys.argv[2:]
-programs = {}
+programs = collections.Counter()
 for test in json.load(sys.stdin)["tests"]:
-    command = [word for word in test["command"] if not word.startswith("--gtest")]
+    command = tuple(word for word in test["command"] if not word.startswith("--gtest"))
     if build in command[0]:
-        programs[tuple(command)] = command[0].rsplit("/", 1)[1]
-for number, (command, name) in enumerate(sorted(programs.items()), 1):
+        programs[command] += 1
+for number, (command, tests) in enumerate(programs.most_common(), 1):
+    name = command[0].rsplit("/", 1)[1]
     words = " ".join(f"[==[{word}]==]" for word in [*wrapper, *command])
-    print(f"add_test({name}.{number} {words})")
-    print(f"set_tests_properties({name}.{number} PROPERTIES TIMEOUT 3600)")
+    shards = 1 + tests // 50
+    for shard in range(shards):
+        print(f"add_test({name}.{number}.{shard} {words})")
+        print(f"set_tests_properties({name}.{number}.{shard} PROPERTIES TIMEOUT 3600",
+              f"ENVIRONMENT [==[GTEST_TOTAL_SHARDS={shards};GTEST_SHARD_INDEX={shard}]==])")
 ' "/build/$preset/" "$@" >"$directory/CTestTestfile.cmake"
     ctest --test-dir "$directory" --parallel "$(nproc)" --output-on-failure --no-tests=error
 }
