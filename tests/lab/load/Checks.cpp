@@ -8,6 +8,7 @@
 #include "operations/StatusText.h"
 #include "schema/MofWriter.h"
 #include "schema/ObjectPathText.h"
+#include "schema/StringLiteral.h"
 
 namespace cimhost::lab {
 namespace {
