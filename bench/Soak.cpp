@@ -56,7 +56,7 @@ Soak::Requests Soak::allReads(bool gated) {
     Requests reads{{Request::associators(computer, leaseSettings()), 1},
                    {Request::associatorNames(computer, leaseSettings()), 1},
                    {Request::getInstance(assetPath()), 1},
-                   {Request::getInstance(missing), 0, gated ? CMPI_RC_ERR_NOT_FOUND : CMPI_RC_OK}};
+                   {Request::getInstance(missing), 0, static_cast<int>(gated ? CMPI_RC_ERR_NOT_FOUND : CMPI_RC_OK)}};
     for (const Population& each : populations) {
         const std::size_t results = gated ? each.gated : each.alone;
         reads.push_back({Request::enumerateInstances(classPath(each.className)), results});

@@ -3,6 +3,7 @@
 #include "CMPILeaseSetting.h"
 #include "CMPIWarrantySetting.h"
 #include "KO/ProviderUtilities.h"
+#include "NodesFixture.h"
 #include "Support.h"
 #include "broker/Broker.h"
 #include "broker/RequestScope.h"
