@@ -43,7 +43,7 @@ TEST_F(ObjectManagerTest, CreateInstanceMayReturnAnInstance) {
 TEST_F(ObjectManagerTest, CreateInstanceMustReturnSomething) {
     const auto created = create("Sample_Silent", "c");
     EXPECT_EQ(created.status.rc, CMPI_RC_ERR_FAILED);
-    EXPECT_THAT(created.status.message, testing::HasSubstr("returned neither path nor instance"));
+    EXPECT_THAT(created.status.message, testing::HasSubstr("returned neither a path nor an instance"));
 }
 
 TEST_F(ObjectManagerTest, CreateHandsOverKeysThenProperties) {

@@ -103,7 +103,7 @@ const BadMof meaning[] = {
     {"PropertyAssignedTwice", "class C { string A; }; instance of C { A = \"1\"; a = \"2\"; };", "1:49", "given twice"},
     {"UnknownAlias", "class C { C REF A; }; instance of C { A = $B; };", "1:43", "$B is not an alias"},
     {"AliasForString", "class C { [Key] string A; }; instance of C as $X { A = \"\"; }; instance of C { A = $X; };",
-     "1:83", "no reference"},
+     "1:83", "not a reference"},
     {"MissingInclude", "class C {};\n#pragma include (\"missing.mof\")", "2:1",
      "missing.mof: this file does not exist"},
 };

@@ -172,7 +172,7 @@ TEST_P(MalformedPath, IsRejectedWithItsPosition) {
 INSTANTIATE_TEST_SUITE_P(
     Texts, MalformedPath,
     testing::Values(BadPath{"", "character 1: expected a class name"},
-                    BadPath{"Disk.", "character 6: expected the name"}, BadPath{"Disk.ID", "character 8: expected ="},
+                    BadPath{"Disk.", "character 6: expected a key name"}, BadPath{"Disk.ID", "character 8: expected ="},
                     BadPath{"Disk.ID=", "character 9: expected a key's"},
                     BadPath{"Disk.ID=\"x", "character 11: expected the closing"},
                     BadPath{"Disk.ID=\"x\\", "character 11: expected the closing"},

@@ -201,7 +201,7 @@ TEST_F(EmulationTest, APathReplacesARejectedInstance) {
 
 TEST_F(EmulationTest, ACreationWithoutResultCrashesOrBreaksTheResponse) {
     as(Manager::standard);
-    EXPECT_THAT(create("Echo_ReturnsNothing").status.message, HasSubstr("neither path nor instance"));
+    EXPECT_THAT(create("Echo_ReturnsNothing").status.message, HasSubstr("neither a path nor an instance"));
     as(Manager::sfcb);
     const auto fatal = create("Echo_ReturnsNothing");
     EXPECT_EQ(fatal.status.rc, CMPI_RC_ERR_FAILED);
@@ -278,9 +278,9 @@ TEST_F(EmulationTest, StringsLoseBlanksAndOtherBytesAtTheirEnds) {
 TEST_F(EmulationTest, NamesKeepTheClientsLetterCase) {
     for (const Manager each : cimhost::lab::everyManager) {
         as(each);
-        manager().perform(Request::getInstance(
-            testsupport::objectPath("root/cimv2", "WITNESS_thing", {with("nAmE", text("there"))})));
-        EXPECT_THAT(seen(), StartsWith("WITNESS_thing.nAmE=there;"));
+        manager().perform(
+            Request::getInstance(testsupport::objectPath("root/cimv2", "ECHO_thing", {with("nAmE", text("there"))})));
+        EXPECT_THAT(seen(), StartsWith("ECHO_thing.nAmE=there;"));
     }
 }
 
@@ -302,10 +302,9 @@ TEST_F(EmulationTest, AProviderReceivesItsAssociationClassOrThatOfTheClient) {
 TEST_F(EmulationTest, AnAssociationClassThatTheClientSentReachesTheProviderAsSent) {
     for (const Manager each : cimhost::lab::everyManager) {
         as(each);
-        const auto found =
-            manager().perform(Request::associators(path("Echo_Thing", "a"), {"WITNESS_Link", {}, {}, {}}));
+        const auto found = manager().perform(Request::associators(path("Echo_Thing", "a"), {"ECHO_Link", {}, {}, {}}));
         ASSERT_EQ(found.instances.size(), 1U);
-        EXPECT_THAT(stringOf(found.instance().properties, "Text").value_or(""), StartsWith("WITNESS_Link,"));
+        EXPECT_THAT(stringOf(found.instance().properties, "Text").value_or(""), StartsWith("ECHO_Link,"));
     }
 }
 
@@ -373,7 +372,7 @@ TEST_F(EmulationTest, FactoriesAreCalledOnceAProviderOrOnceAClass) {
          {std::pair(Manager::standard, 1U), std::pair(Manager::sfcb, 2U), std::pair(Manager::openPegasus, 1U)}) {
         as(each);
         told("Echo_Broker");
-        told("WITNESS_broker");
+        told("ECHO_broker");
         told("Echo_Seen");
         EXPECT_EQ(log.size(), calls);
     }

@@ -104,15 +104,15 @@ TEST(LoadCommand, ReportsErrorsOfTheCommandLine) {
         {{"load"}, "CLASS is required"},
         {{"load", "Inventory_Missing"}, "not in the schema"},
         {{"load", "Inventory_Pair"}, "other keys than one string"},
-        {{"load", "Inventory_Sealed"}, "leave modify out of the mix"},
+        {{"load", "Inventory_Sealed"}, "omit modify from the mix"},
         {{"load", "Inventory_Thing.Name=\"x\""}, "is the path of an instance; write a class"},
         {{"load", "Inventory_Thing", "--mix", "fly=1"}, "fly is not one of"},
-        {{"load", "Inventory_Thing", "--mix", "associate=1"}, "no instance whose associations"},
+        {{"load", "Inventory_Thing", "--mix", "associate=1"}, "no instance to start from"},
         {{"load", "Inventory_Thing", "--clients", "0"}, "--clients"},
         {{"load", "Inventory_Thing", "--requests", "many"}, "--requests"},
         {{"load", "Inventory_Thing", "--show", "some"}, "--show"},
-        {{"--raw", "load", "Inventory_Thing"}, "load has many"},
-        {{"--format", "mof", "load", "Inventory_Thing"}, "--format mof shows instances"},
+        {{"--raw", "load", "Inventory_Thing"}, "load sends many"},
+        {{"--format", "mof", "load", "Inventory_Thing"}, "--format mof shows only instances"},
     };
     for (const auto& [words, complaint] : lines) {
         const Ended refused = runInventory(words);

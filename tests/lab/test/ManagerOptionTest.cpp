@@ -19,9 +19,10 @@ TEST(ManagerOption, TheStandardOneIsTheDefault) {
 TEST(ManagerOption, AnExceptionIsACrashOrUnknown) {
     const Ended dead = run({"--as", "sfcb", "gi", "Test_Answer.Code=999"});
     EXPECT_EQ(dead.status, 1);
-    EXPECT_EQ(dead.error,
-              "cimhost-lab: error 1 (CMPI_RC_ERR_FAILED): The manager's provider process would have died: An exception "
-              "left the provider: the provider is at its wit's end\n");
+    EXPECT_EQ(
+        dead.error,
+        "cimhost-lab: error 1 (CMPI_RC_ERR_FAILED): The manager's provider process would have died: The provider threw "
+        "an exception: the provider is at its wit's end\n");
     const Ended unknown = run({"--as", "pegasus", "gi", "Test_Answer.Code=999"});
     EXPECT_EQ(unknown.status, 1);
     EXPECT_EQ(unknown.error, "cimhost-lab: error 1 (CMPI_RC_ERR_FAILED): Unknown error.\n");
