@@ -4,7 +4,6 @@
 #include "CMPIWarrantySetting.h"
 #include "KO/ProviderUtilities.h"
 #include "NodesFixture.h"
-#include "NodesFixture.h"
 #include "Support.h"
 #include "broker/Broker.h"
 #include "broker/RequestScope.h"
