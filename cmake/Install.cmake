@@ -1,4 +1,4 @@
-# Where things are installed, and in which component: provider, agent, host or development.
+# Where things are installed, and in which component: provider, agent, host, development, or one of fleet/
 include(GNUInstallDirs)
 
 set(LAW_PROVIDER_DIRECTORY ${CMAKE_INSTALL_LIBDIR}/cmpi)
