@@ -10,7 +10,7 @@ sys.path.insert(0, str(pathlib.Path(__file__).resolve().parent.parent / "manual"
 from surroundings import Surroundings
 
 ROOT = pathlib.Path(__file__).resolve().parent.parent.parent
-PROVIDERS = {"gate": "gate/LeaseAndWarrantyGate.reg", "bare": "LeaseAndWarrantyProvider.reg"}
+PROVIDERS = {"gate": "LeaseAndWarrantyGate.reg", "bare": "LeaseAndWarrantyProvider.reg"}
 THIS_COMPUTER = "/system/computer"
 LEASE = {"Lessor": "ACME Leasing Co", "BaseTermCommencementDate": "20250131000000.000000+060", "LeaseTerm": "37",
          "BaseRent": "1250.00 EUR"}
@@ -26,8 +26,8 @@ class Fleet(Surroundings):
         super().__init__(build)
         if provider:
             data = build / "share" / "lease-warranty-provider"
-            self.environment["CIMHOST_REGISTRATION"] = f"{data / PROVIDERS[provider]}:" \
-                f"{data / 'OstrelComputerSystemProvider.reg'}"
+            self.environment["CIMHOST_REGISTRATION"] = ":".join(
+                str(next(data.rglob(name))) for name in (PROVIDERS[provider], "OstrelComputerSystemProvider.reg"))
 
     def create(self, class_name, identifier, values):
         path = f'{class_name}.InstanceID="{identifier}"'
