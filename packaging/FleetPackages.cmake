@@ -21,8 +21,8 @@ law_package(facts lease-warranty-facts
     DOCUMENTS lease-warranty-export.md
     DEPENDS "${needs_common}, ${reads_machine}"
     DESCRIPTION "lease and warranty data of this computer as JSON and Ansible fact
-The command lease-warranty-export, and a fact for Ansible that calls it: leases,
-warranties, asset identification and agent identity.")
+The command lease-warranty-export, and a fact for Ansible that calls it. They
+return leases, warranties, asset identification and agent identity.")
 
 law_package(metrics lease-warranty-metrics
     DOCUMENTS lease-warranty-metrics.md
