@@ -58,8 +58,8 @@ def check_records(kind, path, content, identifiers):
     except ValueError as error:
         raise Unreadable(f"{path} is damaged: its first line is not a number. Restore a copy.") from error
     if len(words) != 1 + count * kind.fields:
-        raise Unreadable(f"{path} is damaged: it has {len(words) - 1} values instead of {count} times {kind.fields}. "
-                         "Restore a copy.")
+        raise Unreadable(f"{path} is damaged: it has {len(words) - 1} of the {count * kind.fields} values of {count} "
+                         "records. Restore a copy.")
     stored = [word.decode("utf-8", "replace").replace("_", " ") for word in words[1::kind.fields]]
     if [comparable(each) for each in stored] != [comparable(each) for each in identifiers]:
         raise Unreadable(f"{path} has {count} records, but cimhost returned others. It may be damaged; see the agent's "
@@ -67,5 +67,5 @@ def check_records(kind, path, content, identifiers):
 
 
 def comparable(identifier):
-    """Without characters in the place of invalid bytes, and without blanks that a reader takes for underscores."""
+    """The identifier without replacement characters, and with a blank for each underscore, as the provider reads it."""
     return identifier.replace("\ufffd", "").replace("_", " ")

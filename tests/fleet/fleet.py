@@ -58,7 +58,7 @@ class Fleet(Surroundings):
         return json.loads(self.succeed("lease-warranty-export"))
 
     def replace_cimhost(self, script):
-        """A shell script in the place of cimhost; it finds the real one as $cimhost."""
+        """Replaces cimhost by a shell script, in which $cimhost is the real program."""
         program = self.directory / "bin" / "cimhost"
         program.write_text(f"#!/bin/sh\ncimhost='{self.build / 'bin' / 'cimhost'}'\n{script}\n", encoding="utf-8")
         program.chmod(0o755)
