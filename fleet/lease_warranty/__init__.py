@@ -1,1 +1,1 @@
-"""What the fleet tools share: reading the data of a machine, dates and terms, writing of files."""
+"""Shared by the fleet tools: reading the data of a machine, dates and terms, writing of files."""
