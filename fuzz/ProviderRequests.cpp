@@ -55,7 +55,8 @@ std::string described(const cimhost::ObjectPath& path) {
 std::string described(const cimhost::Instance& instance) {
     std::string description = described(instance.path);
     for (const cimhost::NamedValue& property : instance.properties) {
-        description += ";" + property.name + "=" + cimhost::formatMof(property.value);
+        const bool isNow = property.name == "LocalDateTime";
+        description += ";" + property.name + (isNow ? "" : "=" + cimhost::formatMof(property.value));
     }
     return description;
 }
