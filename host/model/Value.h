@@ -43,6 +43,11 @@ std::string_view typeName(CMPIType type);
 /** The intrinsic type of this name in MOF, which ignores letter case; none for other names. */
 std::optional<CMPIType> intrinsicType(std::string_view name);
 
+/** Whether the type is one of the eight integer types, or an array of them. */
+inline bool isInteger(CMPIType type) {
+    return (type & CMPI_INTEGER) != 0 && (type & CMPI_ENC) == 0;
+}
+
 /** A CIM value, also null, with its declared type. */
 struct Value {
     CMPIType type = CMPI_null;       ///< element type, without CMPI_ARRAY
