@@ -76,7 +76,7 @@ bool isTimeOfDay(std::string_view string) {
 }  // namespace
 
 bool isDateTime(std::string_view string) {
-    if (string.size() != 25 || string[14] != '.' || !isFraction(string.substr(15, 6))) {
+    if (string.size() != noDate.size() || string[14] != '.' || !isFraction(string.substr(15, 6))) {
         return false;
     }
     if (isDigit(string[15]) && !isDigit(string[13])) {

@@ -6,7 +6,7 @@
 
 namespace cim {
 
-/** The datetime that represents no date. */
+/** The datetime that represents no date. It has the length of any CIM datetime. */
 constexpr std::string_view noDate = "00000000000000.000000-000";
 
 /** Whether a string is noDate, with either sign of the offset. */

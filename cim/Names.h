@@ -1,5 +1,7 @@
 #pragma once
 
+#include <algorithm>
+#include <iterator>
 #include <string>
 #include <string_view>
 
@@ -7,6 +9,14 @@ namespace cim {
 
 /** Whether two names are the same: the case of the letters A to Z is ignored, in every locale. */
 bool sameName(std::string_view left, std::string_view right);
+
+/** The element of a container whose member `name` is the same name; null if there is none. */
+template <class Elements>
+auto* findNamed(Elements& elements, std::string_view name) {
+    const auto found = std::find_if(std::begin(elements), std::end(elements),
+                                    [&](const auto& each) { return sameName(each.name, name); });
+    return found == std::end(elements) ? nullptr : &*found;
+}
 
 /** The name in lower case, for use as a key. */
 std::string foldedName(std::string_view name);

@@ -32,6 +32,11 @@ inline Utf8Character firstCharacter(std::string_view string) {
     return {codePoint, static_cast<std::size_t>(end - head.begin()), true};
 }
 
+/** Whether a byte continues a UTF-8 character that an earlier byte begins. */
+inline bool continuesCharacter(char byte) {
+    return (static_cast<unsigned char>(byte) & 0xC0U) == 0x80U;
+}
+
 /** Position of the first byte that is not part of valid UTF-8; std::string_view::npos if there is none. */
 inline std::size_t findInvalidUtf8(std::string_view string) {
     const auto* const byte = utf8::find_invalid(string.begin(), string.end());

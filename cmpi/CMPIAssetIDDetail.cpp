@@ -1,6 +1,5 @@
 #include "CMPIAssetIDDetail.h"
 
-#include "LoggerNames.h"
 #include "ProductAdapterImpl.h"
 
 #include <vector>
@@ -147,7 +146,7 @@ void AssetAdapterTraits::modify(AssetIDDetails& details, const CMPIInstance* ins
     details.flushAssetData();
 }
 
-template class ElementAdapter<AssetAdapterTraits>;
+template class ElementAdapter<CMPIAssetIDDetail, AssetAdapterTraits>;
 template class ProductAdapter<AssetAdapterTraits>;
 template void CMPIAssetIDDetail::modifyCMPIInstance<AssetAdapterTraits>(const CMPIInstance*, const char**);
 

@@ -31,7 +31,7 @@ struct AssetAdapterTraits {
 /** Adapter of VELKO_AssetIDDetails. */
 using CMPIAssetIDDetail = ProductAdapter<AssetAdapterTraits>;
 
-extern template class ElementAdapter<AssetAdapterTraits>;
+extern template class ElementAdapter<CMPIAssetIDDetail, AssetAdapterTraits>;
 extern template class ProductAdapter<AssetAdapterTraits>;
 extern template void CMPIAssetIDDetail::modifyCMPIInstance<AssetAdapterTraits>(const CMPIInstance*, const char**);
 

@@ -1,7 +1,6 @@
 #include "CMPIComputerSystem.h"
 
 #include "KO/Exceptions.h"
-#include "LoggerNames.h"
 #include "Trace.h"
 #include "cim/CmpiAccess.h"
 
@@ -30,19 +29,16 @@ CMPILAWComputerSystem::~CMPILAWComputerSystem() {
 }
 
 bool CMPILAWComputerSystem::hasNext() const {
-    CMPIStatus status{CMPI_RC_OK, nullptr};
-    return enumeration != nullptr && enumeration->ft->hasNext(enumeration, &status) == 1;
+    return cim::ask<&CMPIEnumerationFT::hasNext>(enumeration).value == 1;
 }
 
 /** Makes the enumeration's next instance current. On failure, keeps the current one. */
 bool CMPILAWComputerSystem::takeNext() {
-    CMPIStatus status{CMPI_RC_OK, nullptr};
-    const CMPIData next = enumeration->ft->getNext(enumeration, &status);
-    if (status.rc != CMPI_RC_OK) {
-        return false;
+    const auto next = cim::ask<&CMPIEnumerationFT::getNext>(enumeration);
+    if (next.isOk()) {
+        current = cim::elementInstance(next.value);
     }
-    current = cim::elementInstance(next);
-    return true;
+    return next.isOk();
 }
 
 void CMPILAWComputerSystem::setObjectPath(const CMPIObjectPath* path) {
@@ -64,19 +60,13 @@ CMPILAWComputerSystem::operator bool() {
 void CMPILAWComputerSystem::operator++() {
     const Traced traced(at(traceSource));
     current = nullptr;
-    if (enumeration != nullptr) {
-        takeNext();
-    }
+    takeNext();
 }
 
 CMPIObjectPath* CMPILAWComputerSystem::getObjectPath() {
     const Traced traced(at(traceSource));
-    if (current == nullptr) {
-        return nullptr;
-    }
-    CMPIStatus status{CMPI_RC_OK, nullptr};
-    CMPIObjectPath* path = current->ft->getObjectPath(current, &status);
-    return status.rc == CMPI_RC_OK ? path : nullptr;
+    const auto path = cim::ask<&CMPIInstanceFT::getObjectPath>(current);
+    return path.isOk() ? path.value : nullptr;
 }
 
 CMPIInstance* CMPILAWComputerSystem::getCMPIInstance(const char** properties) {

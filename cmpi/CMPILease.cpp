@@ -1,6 +1,5 @@
 #include "CMPILease.h"
 
-#include "LoggerNames.h"
 #include "RecordAdapterImpl.h"
 
 namespace KO::LeaseWarrantyProvider {
@@ -34,7 +33,7 @@ const std::array<PropertyRow<L>, 18> LeaseAdapterTraits::properties{{
     modifiable<L, &L::getNetMonthlyLeaseRateFactor, &L::setNetMonthlyLeaseRateFactor>("NetMonthlyLeaseRateFactor"),
 }};
 
-template class ElementAdapter<LeaseAdapterTraits>;
+template class ElementAdapter<CMPILease, LeaseAdapterTraits>;
 template class RecordAdapter<LeaseAdapterTraits>;
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -24,7 +24,7 @@ struct LeaseAdapterTraits {
 /** Adapter of VELKO_Lease. */
 using CMPILease = RecordAdapter<LeaseAdapterTraits>;
 
-extern template class ElementAdapter<LeaseAdapterTraits>;
+extern template class ElementAdapter<CMPILease, LeaseAdapterTraits>;
 extern template class RecordAdapter<LeaseAdapterTraits>;
 
 }  // namespace KO::LeaseWarrantyProvider

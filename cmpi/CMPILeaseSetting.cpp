@@ -1,6 +1,5 @@
 #include "CMPILeaseSetting.h"
 
-#include "LoggerNames.h"
 #include "SettingAdapterImpl.h"
 
 namespace KO::LeaseWarrantyProvider {

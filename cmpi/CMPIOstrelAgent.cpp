@@ -1,6 +1,5 @@
 #include "CMPIOstrelAgent.h"
 
-#include "LoggerNames.h"
 #include "ProductAdapterImpl.h"
 
 namespace KO::LeaseWarrantyProvider {
@@ -40,7 +39,7 @@ const std::array<PropertyRow<A>, 9> AgentAdapterTraits::properties{{
     readOnly<A, &A::getVersion>("Version"),
 }};
 
-template class ElementAdapter<AgentAdapterTraits>;
+template class ElementAdapter<CMPIOstrelAgent, AgentAdapterTraits>;
 template class ProductAdapter<AgentAdapterTraits>;
 
 }  // namespace KO::LeaseWarrantyProvider

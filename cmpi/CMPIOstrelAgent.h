@@ -25,7 +25,7 @@ struct AgentAdapterTraits {
 /** Adapter of VELKO_OstrelAgent, which is read-only. */
 using CMPIOstrelAgent = ProductAdapter<AgentAdapterTraits>;
 
-extern template class ElementAdapter<AgentAdapterTraits>;
+extern template class ElementAdapter<CMPIOstrelAgent, AgentAdapterTraits>;
 extern template class ProductAdapter<AgentAdapterTraits>;
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -1,6 +1,5 @@
 #include "CMPIWarranty.h"
 
-#include "LoggerNames.h"
 #include "RecordAdapterImpl.h"
 
 namespace KO::LeaseWarrantyProvider {
@@ -24,7 +23,7 @@ const std::array<PropertyRow<W>, 9> WarrantyAdapterTraits::properties{{
     modifiable<W, &W::getWarrantor, &W::setWarrantor>("Warrantor"),
 }};
 
-template class ElementAdapter<WarrantyAdapterTraits>;
+template class ElementAdapter<CMPIWarranty, WarrantyAdapterTraits>;
 template class RecordAdapter<WarrantyAdapterTraits>;
 
 }  // namespace KO::LeaseWarrantyProvider

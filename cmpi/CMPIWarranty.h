@@ -24,7 +24,7 @@ struct WarrantyAdapterTraits {
 /** Adapter of VELKO_Warranty. */
 using CMPIWarranty = RecordAdapter<WarrantyAdapterTraits>;
 
-extern template class ElementAdapter<WarrantyAdapterTraits>;
+extern template class ElementAdapter<CMPIWarranty, WarrantyAdapterTraits>;
 extern template class RecordAdapter<WarrantyAdapterTraits>;
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -1,6 +1,5 @@
 #include "CMPIWarrantySetting.h"
 
-#include "LoggerNames.h"
 #include "SettingAdapterImpl.h"
 
 namespace KO::LeaseWarrantyProvider {

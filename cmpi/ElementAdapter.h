@@ -9,13 +9,19 @@ namespace KO::LeaseWarrantyProvider {
 /**
  * Base of RecordAdapter and ProductAdapter: owns the managed element and has the element's position.
  *
- * Traits defines Element, traceSource, and the names of the constructor and the destructor in the log.
+ * Adapter is the derived class. Its narrow(element, path) sets the element's filters from the path's keys; its
+ * getObjectPath() returns the path of the current instance.
+ *
+ * Traits defines Element, traceSource, properties, and the names of the constructor and the destructor in the log.
  */
-template <class Traits>
+template <class Adapter, class Traits>
 class ElementAdapter {
 public:
     /** Starts at the first object of the element. */
     ElementAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext, std::string requestNameSpace);
+
+    /** Starts at the first object that the path's keys select. Throws the exceptions of the element's setFilter. */
+    ElementAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext, const CMPIObjectPath* path);
 
     /** Destroys the element, whose destructor may throw. */
     ~ElementAdapter() noexcept(false);
@@ -28,12 +34,14 @@ public:
     /** Moves to the next instance that the path selects. */
     void operator++();
 
+    /** Sets the element's filters from the path's keys. Throws the exceptions of the element's setFilter. */
+    void setObjectPath(const CMPIObjectPath* path);
+
+    /** Returns the current instance with every property that has a value; null if the broker cannot create it. */
+    CMPIInstance* getCMPIInstance(const char** properties);
+
 protected:
     using Element = typename Traits::Element;
-
-    /** Starts at the first object that the path's keys select. `narrow` sets the element's filters from the keys. */
-    ElementAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext, const CMPIObjectPath* path,
-                   void (*narrow)(Element& element, const CMPIObjectPath* path));
 
     const CMPIBroker* broker;
     const CMPIContext* context;

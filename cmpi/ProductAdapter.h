@@ -46,18 +46,10 @@ struct KeyFilter {
  *   modify(element, instance)   only for a class that can be modified
  */
 template <class Traits>
-class ProductAdapter : public ElementAdapter<Traits> {
+class ProductAdapter : public ElementAdapter<ProductAdapter<Traits>, Traits> {
 public:
-    using ElementAdapter<Traits>::ElementAdapter;
-
-    /**
-     * Selects the instances that match the path's keys, or all if it has none. Throws the exceptions of the element's
-     * setFilter.
-     */
-    ProductAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext, const CMPIObjectPath* path);
-
-    /** Sets the element's filters from the path's keys. Throws the exceptions of the element's setFilter. */
-    void setObjectPath(const CMPIObjectPath* path);
+    /** A path selects the instances that match its keys, or all if it has none. */
+    using ElementAdapter<ProductAdapter, Traits>::ElementAdapter;
 
     /**
      * Returns the path of the current instance; null if the broker cannot create it. A key without a value repeats the
@@ -65,17 +57,15 @@ public:
      */
     CMPIObjectPath* getObjectPath();
 
-    /** Returns the current instance; null if the broker cannot create it. */
-    CMPIInstance* getCMPIInstance(const char** properties);
-
     /** Writes the instance's modifiable properties. A null instance changes nothing. */
     template <class ModifiablePolicy = Traits>
     void modifyCMPIInstance(const CMPIInstance* referenceInstance, const char** properties);
 
 private:
-    using ElementAdapter<Traits>::broker;
-    using ElementAdapter<Traits>::nameSpace;
-    using ElementAdapter<Traits>::element;
+    friend class ElementAdapter<ProductAdapter, Traits>;
+    using ElementAdapter<ProductAdapter, Traits>::broker;
+    using ElementAdapter<ProductAdapter, Traits>::nameSpace;
+    using ElementAdapter<ProductAdapter, Traits>::element;
 
     static void narrow(typename Traits::Element& element, const CMPIObjectPath* path);
 };

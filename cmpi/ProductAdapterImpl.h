@@ -18,16 +18,6 @@ constexpr const char* keyValueName = "l_keyValue";
 }  // namespace
 
 template <class Traits>
-ProductAdapter<Traits>::ProductAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext,
-                                       const CMPIObjectPath* path)
-    : ElementAdapter<Traits>(requestBroker, requestContext, path, &narrow) {}
-
-template <class Traits>
-void ProductAdapter<Traits>::setObjectPath(const CMPIObjectPath* path) {
-    narrow(element, path);
-}
-
-template <class Traits>
 void ProductAdapter<Traits>::narrow(typename Traits::Element& element, const CMPIObjectPath* path) {
     const Traced traced(at(Traits::traceSource, Level::flow, "setObjectPath"));
     if (ProviderUtilities::getKeyCount(path) == 0) {
@@ -56,16 +46,6 @@ CMPIObjectPath* ProductAdapter<Traits>::getObjectPath() {
         ProviderUtilities::setKeyProperty(path, key.name, value);
     }
     return path;
-}
-
-template <class Traits>
-CMPIInstance* ProductAdapter<Traits>::getCMPIInstance(const char** properties) {
-    const Traced traced(at(Traits::traceSource), label::properties, properties);
-    CMPIInstance* instance = ProviderUtilities::createInstance(broker, getObjectPath());
-    if (instance != nullptr) {
-        fillInstance(Traits::properties, element, broker, instance);
-    }
-    return instance;
 }
 
 template <class Traits>

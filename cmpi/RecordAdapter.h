@@ -19,28 +19,17 @@ namespace KO::LeaseWarrantyProvider {
  *   traceSource, properties      trace source and table of PropertyRow of the class
  */
 template <class Traits>
-class RecordAdapter : public ElementAdapter<Traits> {
+class RecordAdapter : public ElementAdapter<RecordAdapter<Traits>, Traits> {
 public:
-    /** Selects all records. For CreateInstance and for the ends of associations. */
-    using ElementAdapter<Traits>::ElementAdapter;
-
     /**
-     * Selects the record with the path's key, or all records if the path has no readable key. The destructor writes the
-     * data file if anything changed, and may throw.
+     * A namespace selects all records, for CreateInstance and for the ends of associations. A path selects the record
+     * with its key, or all records if it has no readable key. The destructor writes the data file if anything changed,
+     * and may throw.
      */
-    RecordAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext, const CMPIObjectPath* path);
-
-    /** Selects the record with the path's key. A key that cannot be read is ignored. */
-    void setObjectPath(const CMPIObjectPath* path);
+    using ElementAdapter<RecordAdapter, Traits>::ElementAdapter;
 
     /** Returns the path of the current record; without key if there is none, null if the broker cannot create it. */
     CMPIObjectPath* getObjectPath();
-
-    /**
-     * Returns the instance of the current record with every property that has a value; null if the broker cannot create
-     * it.
-     */
-    CMPIInstance* getCMPIInstance(const char** properties);
 
     /**
      * Creates a record with the path's key and default values, and makes it current. Throws the exceptions of the
@@ -63,9 +52,10 @@ public:
     void deleteCMPIInstance();
 
 private:
-    using ElementAdapter<Traits>::broker;
-    using ElementAdapter<Traits>::nameSpace;
-    using ElementAdapter<Traits>::element;
+    friend class ElementAdapter<RecordAdapter, Traits>;
+    using ElementAdapter<RecordAdapter, Traits>::broker;
+    using ElementAdapter<RecordAdapter, Traits>::nameSpace;
+    using ElementAdapter<RecordAdapter, Traits>::element;
 
     static void narrow(typename Traits::Element& element, const CMPIObjectPath* path);
 };

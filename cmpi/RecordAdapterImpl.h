@@ -24,30 +24,16 @@ constexpr const char* instanceIdKey = "InstanceID";
 
 /** Returns the characters of a path's string key; none if the key has another type or cannot be read. */
 std::optional<std::string> stringKey(const CMPIObjectPath* path, const char* name) {
-    CMPIStatus status{CMPI_RC_OK, nullptr};
-    const CMPIData key = path->ft->getKey(path, name, &status);
-    const bool isString = cim::hasValue(key) && key.type == CMPI_string;
-    if (status.rc != CMPI_RC_OK || !isString || key.value.string == nullptr) {
+    const auto key = cim::ask<&CMPIObjectPathFT::getKey>(path, name);
+    if (!key.isOk() || !cim::hasValue(key.value) || key.value.type != CMPI_string) {
         return std::nullopt;
     }
-    const char* characters = key.value.string->ft->getCharPtr(key.value.string, &status);
-    if (status.rc != CMPI_RC_OK || characters == nullptr) {
-        return std::nullopt;
-    }
-    return characters;
+    const auto characters = cim::ask<&CMPIStringFT::getCharPtr>(key.value.value.string);
+    return characters.isOk() && characters.value != nullptr ? std::optional<std::string>(characters.value)
+                                                            : std::nullopt;
 }
 
 }  // namespace
-
-template <class Traits>
-RecordAdapter<Traits>::RecordAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext,
-                                     const CMPIObjectPath* path)
-    : ElementAdapter<Traits>(requestBroker, requestContext, path, &narrow) {}
-
-template <class Traits>
-void RecordAdapter<Traits>::setObjectPath(const CMPIObjectPath* path) {
-    narrow(element, path);
-}
 
 template <class Traits>
 void RecordAdapter<Traits>::narrow(typename Traits::Element& element, const CMPIObjectPath* path) {
@@ -72,16 +58,6 @@ CMPIObjectPath* RecordAdapter<Traits>::getObjectPath() {
 }
 
 template <class Traits>
-CMPIInstance* RecordAdapter<Traits>::getCMPIInstance(const char** properties) {
-    const Traced traced(at(Traits::traceSource), label::properties, properties);
-    CMPIInstance* instance = ProviderUtilities::createInstance(broker, getObjectPath());
-    if (instance != nullptr) {
-        fillInstance(Traits::properties, element, broker, instance);
-    }
-    return instance;
-}
-
-template <class Traits>
 CMPIInstance* RecordAdapter<Traits>::createCMPIInstance(const CMPIObjectPath* desiredObjectPath) {
     const Traced traced(at(Traits::traceSource), label::desiredObjectPath, desiredObjectPath);
     std::string instanceId;
@@ -98,8 +74,8 @@ CMPIInstance* RecordAdapter<Traits>::createCMPIInstance(const CMPIObjectPath* de
     if constexpr (Traits::tracesCreation) {
         traceVariable(at(Traits::traceSource), "Instance Created", 1U);
     }
-    setObjectPath(desiredObjectPath);
-    return getCMPIInstance(nullptr);
+    narrow(element, desiredObjectPath);
+    return this->getCMPIInstance(nullptr);
 }
 
 template <class Traits>
@@ -120,7 +96,7 @@ template <class Traits>
 void RecordAdapter<Traits>::deleteCMPIInstance() {
     CMPIInstance* instance = nullptr;
     const Traced traced(at(Traits::traceSource), label::instance, instance);
-    instance = getCMPIInstance(nullptr);
+    instance = this->getCMPIInstance(nullptr);
     element.remove();
 }
 

@@ -1,19 +1,19 @@
 #include "AssetIDDetails.h"
 
-#include "AssetKeys.h"
+#include "AssetFile.h"
 #include "KO/File.h"
 #include "KO/PlatformUtilities.h"
 #include "KO/Product.h"
 #include "KO/PropertyFile.h"
 #include "KO/Strings.h"
 #include "KO/Utils.h"
-#include "LoggerNames.h"
 #include "Trace.h"
 
 #include <algorithm>
 #include <array>
 #include <ctime>
 #include <optional>
+#include <type_traits>
 #include <variant>
 
 namespace KO {
@@ -30,23 +30,12 @@ namespace {
 
 const TraceSource traceSource{loggerAssetIDDetails, "AssetIDDetails.cpp"};
 
-constexpr const wchar_t* assetFileName = L"asset.dat";
 constexpr const char* assetCaption = "Asset ID Information";
 constexpr unsigned int assetStringArea = 1024;
-constexpr unsigned long withoutLimit = 0xFFFFFFFF;
 constexpr unsigned int presentTime = 3;
 
 /** Value of an empty label or data string, so that all five pairs have values. */
 constexpr const char* emptyPersonalized = "Null";
-
-/** Scoped lock of the asset data file. */
-class FileLock {
-public:
-    FileLock() { _fileMutex.lock(withoutLimit); }
-    ~FileLock() { _fileMutex.unlock(); }
-    FileLock(const FileLock&) = delete;
-    FileLock& operator=(const FileLock&) = delete;
-};
 
 }  // namespace
 
@@ -222,32 +211,27 @@ bool AssetIDDetails::comparedValue(FilterType type, std::string& value) const {
     }
 }
 
-/** Reads a stored string. Traced under the name of the calling getter. */
-bool AssetIDDetails::stored(const CallSite& site, const std::string& member, std::string& value) const {
+template <class Member, class Value>
+bool AssetIDDetails::stored(const CallSite& site, const Member& member, Value& value) const {
     const Traced traced(site);
     if (_Loaded) {
-        value = member;
+        if constexpr (std::is_same_v<Member, DateTime>) {
+            value = Utils::convertCIMDateTime(member);
+        } else {
+            value = member;
+        }
     }
     return _Loaded;
 }
 
-/** Reads a stored date as a CIM datetime string. Traced under the name of the calling getter. */
-bool AssetIDDetails::stored(const CallSite& site, const DateTime& member, std::string& value) const {
+template <class Member, class Value>
+void AssetIDDetails::store(const CallSite& site, Member& member, const Value& value) {
     const Traced traced(site);
-    if (_Loaded) {
-        value = Utils::convertCIMDateTime(member);
+    if constexpr (std::is_same_v<Member, DateTime>) {
+        member = Utils::convertStringToDateTime(value);
+    } else {
+        member = value;
     }
-    return _Loaded;
-}
-
-void AssetIDDetails::store(const CallSite& site, std::string& member, const std::string& value) {
-    const Traced traced(site);
-    member = value;
-}
-
-void AssetIDDetails::store(const CallSite& site, DateTime& member, const std::string& value) {
-    const Traced traced(site);
-    member = Utils::convertStringToDateTime(value);
 }
 
 bool AssetIDDetails::getAssetNumber(std::string& value) const {
@@ -303,11 +287,7 @@ bool AssetIDDetails::getDeploymentUpdateTime(std::string& value) const {
 }
 
 bool AssetIDDetails::getPersonalizedData(std::vector<PersonalizedPair>& value) const {
-    const Traced traced(at(traceSource));
-    if (_Loaded) {
-        value = _PersonalizedData;
-    }
-    return _Loaded;
+    return stored(at(traceSource), _PersonalizedData, value);
 }
 
 bool AssetIDDetails::getCSName(std::string& value) const {
@@ -410,8 +390,7 @@ void AssetIDDetails::setZOPMUpdateTime(const std::string& value) {
 }
 
 void AssetIDDetails::setPersonalizedData(const std::vector<PersonalizedPair>& value) {
-    const Traced traced(at(traceSource));
-    _PersonalizedData = value;
+    store(at(traceSource), _PersonalizedData, value);
 }
 
 }  // namespace KO::LeaseWarrantyProvider

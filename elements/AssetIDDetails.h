@@ -150,10 +150,14 @@ private:
     void readFixedFields(PropertyFile& file);
     void readPersonalizedPairs(PropertyFile& file);
     bool comparedValue(FilterType type, std::string& value) const;
-    bool stored(const CallSite& site, const std::string& member, std::string& value) const;
-    bool stored(const CallSite& site, const DateTime& member, std::string& value) const;
-    static void store(const CallSite& site, std::string& member, const std::string& value);
-    static void store(const CallSite& site, DateTime& member, const std::string& value);
+
+    /** Reads a member if the file was read; a date as its CIM datetime string. Traced under the name of the caller. */
+    template <class Member, class Value>
+    bool stored(const CallSite& site, const Member& member, Value& value) const;
+
+    /** Changes a member; a date from its CIM datetime string. Traced under the name of the caller. */
+    template <class Member, class Value>
+    static void store(const CallSite& site, Member& member, const Value& value);
 
     bool _Loaded = false;
     std::wstring _FileName{};

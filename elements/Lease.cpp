@@ -1,6 +1,5 @@
 #include "Lease.h"
 
-#include "LoggerNames.h"
 #include "RecordElementImpl.h"
 
 namespace KO::LeaseWarrantyProvider {

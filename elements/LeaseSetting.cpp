@@ -1,6 +1,5 @@
 #include "LeaseSetting.h"
 
-#include "LoggerNames.h"
 #include "SettingElementImpl.h"
 
 namespace KO::LeaseWarrantyProvider {

@@ -5,7 +5,6 @@
 #include "KO/PlatformUtilities.h"
 #include "KO/Product.h"
 #include "KO/Strings.h"
-#include "LoggerNames.h"
 #include "Trace.h"
 
 #include <algorithm>

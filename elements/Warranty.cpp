@@ -1,6 +1,5 @@
 #include "Warranty.h"
 
-#include "LoggerNames.h"
 #include "RecordElementImpl.h"
 
 namespace KO::LeaseWarrantyProvider {

@@ -1,6 +1,5 @@
 #include "WarrantySetting.h"
 
-#include "LoggerNames.h"
 #include "SettingElementImpl.h"
 
 namespace KO::LeaseWarrantyProvider {

@@ -1,6 +1,6 @@
 #include "Target.h"
 
-#include "framework/AgentSettings.h"
+#include "framework/AgentState.h"
 #include "logging/LogSettings.h"
 
 #include <limits>

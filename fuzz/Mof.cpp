@@ -1,6 +1,6 @@
 #include "Target.h"
 
-#include "schema/CimType.h"
+#include "model/Value.h"
 #include "schema/Errors.h"
 #include "schema/MofReader.h"
 #include "schema/MofWriter.h"

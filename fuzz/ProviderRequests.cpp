@@ -5,8 +5,8 @@
 #include "Trace.h"
 #include "cim/Names.h"
 #include "model/Request.h"
-#include "schema/MofWriter.h"
 #include "provider/LogDouble.h"
+#include "schema/MofWriter.h"
 #include "support/AssetModel.h"
 #include "support/Values.h"
 

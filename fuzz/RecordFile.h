@@ -49,7 +49,7 @@ public:
     void load() {
         count = 0;
         table.clear();
-        KO::LeaseWarrantyProvider::loadRecords(file.path(), count, table);
+        KO::LeaseWarrantyProvider::loadRecords(file.path(), count, table, Store::fields);
         model.read(file.content());
         std::vector<testsupport::ModelRecord> found;
         for (const auto& unit : table) {
@@ -95,7 +95,7 @@ void requireNothingIsRead(const MemoryFile& file) {
     std::vector<typename Store::Unit> table;
     bool isRefused = false;
     try {
-        KO::LeaseWarrantyProvider::loadRecords(file.path(), count, table);
+        KO::LeaseWarrantyProvider::loadRecords(file.path(), count, table, Store::fields);
     } catch (const std::bad_alloc&) {
         isRefused = true;
     }

@@ -25,7 +25,7 @@ constexpr const char* computerClass = "VELKO_ComputerSystem";
 template <class RecordStore>
 std::vector<testsupport::ModelRecord> recordsOf() {
     std::vector<testsupport::ModelRecord> records;
-    for (const auto& unit : RecordStore::cache().table) {
+    for (const auto& unit : RecordBase<RecordStore>::cache.table) {
         if (unit.inUse) {
             records.push_back(modelOf<RecordStore>(unit));
         }
@@ -35,13 +35,13 @@ std::vector<testsupport::ModelRecord> recordsOf() {
 
 template <class RecordStore>
 unsigned int countOf() {
-    return RecordStore::cache().count();
+    return RecordBase<RecordStore>::cache.count();
 }
 
 /** Creates a table again, as when the library is loaded. */
 template <class RecordStore>
 void reload() {
-    auto& cache = RecordStore::cache();
+    auto& cache = RecordBase<RecordStore>::cache;
     std::destroy_at(&cache);
     new (&cache) RecordCache<RecordStore>;
 }

@@ -65,41 +65,42 @@ static char* formatTrace(char (&buffer)[traceBufferSize], Parts... parts) {
     return buffer;
 }
 
+/** Appends the line of a function's entry, exit or call, or of a message. */
+[[maybe_unused]] static void appendCall(TraceText& text, const char* function, const char* file, unsigned int line,
+                                        MessageType type) {
+    const auto append = [&](auto... parts) { (text.append(parts), ...); };
+    switch (type) {
+        case MT_EXITING:
+            return append("EXITING: ", function, "() in ", file, " [Line: ", line, "]");
+        case MT_METHOD:
+            return append("METHOD: ", function, "() was invoked in ", file, " [Line: ", line, "]");
+        case MT_MESSAGE:
+            return append("MESSAGE [File: ", file, ", Line: ", line, "]: ", function);
+        default:
+            return append("ENTERING: ", function, "() in ", file, " [Line: ", line, "]");
+    }
+}
+
 /**
  * Formats the line of a function's entry, exit or call, or of a message.
  * @param function the function's plain name; for MT_MESSAGE the message instead
  */
 [[maybe_unused]] static char* trace(const char* function, const char* file, unsigned int line, MessageType type) {
     static char buffer[traceBufferSize];
-    switch (type) {
-        case MT_EXITING:
-            return formatTrace(buffer, "EXITING: ", function, "() in ", file, " [Line: ", line, "]");
-        case MT_METHOD:
-            return formatTrace(buffer, "METHOD: ", function, "() was invoked in ", file, " [Line: ", line, "]");
-        case MT_MESSAGE:
-            return formatTrace(buffer, "MESSAGE [File: ", file, ", Line: ", line, "]: ", function);
-        default:
-            return formatTrace(buffer, "ENTERING: ", function, "() in ", file, " [Line: ", line, "]");
-    }
+    TraceText text(buffer);
+    appendCall(text, function, file, line, type);
+    return buffer;
 }
 
 /** Formats a line like trace(), followed by a parameter list. */
 [[maybe_unused]] static char* tracepara(const char* function, const char* file, unsigned int line,
                                         const char* parameters, MessageType type) {
     static char buffer[traceBufferSize];
-    constexpr const char* lineEnd = "],Parameters List: ";
-    switch (type) {
-        case MT_EXITING:
-            return formatTrace(buffer, "EXITING: ", function, "() in ", file, " [Line: ", line, lineEnd, parameters);
-        case MT_METHOD:
-            return formatTrace(buffer, "METHOD: ", function, "() was invoked in ", file, " [Line: ", line, lineEnd,
-                               parameters);
-        case MT_MESSAGE:
-            return formatTrace(buffer, "MESSAGE [File: ", file, ", Line: ", line, "]: ", function,
-                               ",Parameters List: ", parameters);
-        default:
-            return formatTrace(buffer, "ENTERING: ", function, "() in ", file, " [Line: ", line, lineEnd, parameters);
-    }
+    TraceText text(buffer);
+    appendCall(text, function, file, line, type);
+    text.append(",Parameters List: ");
+    text.append(parameters);
+    return buffer;
 }
 
 /** Formats the line with the value of a string variable. */

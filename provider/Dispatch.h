@@ -1,28 +1,40 @@
 #pragma once
 
-#include "Request.h"
+#include <cmpidt.h>
 
-#include <cstddef>
+#include <string>
 
 namespace KO::LeaseWarrantyProvider {
 
-/** Operations that are dispatched by class, in the order of the dispatch table's columns. */
-enum class Operation : std::size_t {
-    enumInstanceNames,
-    enumInstances,
-    getInstance,
-    createInstance,
-    modifyInstance,
-    deleteInstance,
-    associators,
-    associatorNames,
-    count,
+/** A call of one of the provider's entry points: its arguments, all borrowed, and the status to return. */
+struct Invocation {
+    const CMPIBroker* broker;
+    const CMPIContext* context;
+    const CMPIResult* result;
+    const CMPIObjectPath* path;
+    const char** properties = nullptr;       ///< property list, null for all
+    const CMPIInstance* instance = nullptr;  ///< of ModifyInstance
+    std::string nameSpace{};                 ///< of CreateInstance
+    CMPIStatus status{CMPI_RC_OK, nullptr};
 };
 
-/** Handler of an operation for a class. Calls the class's adapter or sets the request's status. */
-using Body = void (*)(Request&);
+/** Performs an operation for a class. Calls the class's adapter or sets the status. */
+using Handler = void (*)(Invocation&);
 
-/** Returns the handler of an operation for a class id; &Handlers::invalidClass for other classes. */
-Body bodyOf(Operation operation, unsigned short classId);
+/** The handlers of the operations for one class. */
+struct ClassHandlers {
+    unsigned short classId;
+    Handler enumInstanceNames;
+    Handler enumInstances;
+    Handler getInstance;
+    Handler createInstance;
+    Handler modifyInstance;
+    Handler deleteInstance;
+    Handler associators;
+    Handler associatorNames;
+};
+
+/** Returns the handlers of a class id. For other classes, each handler is &Handlers::invalidClass. */
+const ClassHandlers& handlersOf(unsigned short classId);
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -1,7 +1,7 @@
 #pragma once
 
 #include "AdapterContract.h"
-#include "Request.h"
+#include "Dispatch.h"
 
 #include <cmpift.h>
 
@@ -23,68 +23,69 @@ inline void give(const CMPIResult* result, const CMPIObjectPath* path) {
 }
 
 /**
- * Iterates over the adapter of the request's path, returns the result of `take` for each element, and calls returnDone.
+ * Iterates over the adapter of the invocation's path, returns the result of `take` for each element, and calls
+ * returnDone.
  */
 template <class Adapter, class Take>
-void walk(const Request& request, Take take) {
+void walk(const Invocation& invocation, Take take) {
     static_assert(AdapterContract::fulfilled<Adapter>);
-    Adapter adapter(request.broker, request.context, request.path);
+    Adapter adapter(invocation.broker, invocation.context, invocation.path);
     while (adapter) {
-        give(request.result, take(adapter));
+        give(invocation.result, take(adapter));
         ++adapter;
     }
-    request.result->ft->returnDone(request.result);
+    invocation.result->ft->returnDone(invocation.result);
 }
 
 template <class Adapter>
-void names(Request& request) {
-    walk<Adapter>(request, [](Adapter& adapter) { return adapter.getObjectPath(); });
+void names(Invocation& invocation) {
+    walk<Adapter>(invocation, [](Adapter& adapter) { return adapter.getObjectPath(); });
 }
 
 template <class Adapter>
-void instances(Request& request) {
-    walk<Adapter>(request, [&](Adapter& adapter) { return adapter.getCMPIInstance(request.properties); });
+void instances(Invocation& invocation) {
+    walk<Adapter>(invocation, [&](Adapter& adapter) { return adapter.getCMPIInstance(invocation.properties); });
 }
 
 template <class Adapter>
-void associators(Request& request) {
-    walk<Adapter>(request, [&](Adapter& adapter) { return adapter.getAssociator(request.properties); });
+void associators(Invocation& invocation) {
+    walk<Adapter>(invocation, [&](Adapter& adapter) { return adapter.getAssociator(invocation.properties); });
 }
 
 template <class Adapter>
-void associatorNames(Request& request) {
-    walk<Adapter>(request, [](Adapter& adapter) { return adapter.getAssociatorNames(); });
+void associatorNames(Invocation& invocation) {
+    walk<Adapter>(invocation, [](Adapter& adapter) { return adapter.getAssociatorNames(); });
 }
 
 /** Takes the new record's key from the path. Returns the new instance, not its path. */
 template <class Adapter>
-void create(Request& request) {
+void create(Invocation& invocation) {
     static_assert(AdapterContract::creates<Adapter>);
-    Adapter adapter(request.broker, request.context, request.nameSpace);
-    give(request.result, adapter.createCMPIInstance(request.path));
-    request.result->ft->returnDone(request.result);
+    Adapter adapter(invocation.broker, invocation.context, invocation.nameSpace);
+    give(invocation.result, adapter.createCMPIInstance(invocation.path));
+    invocation.result->ft->returnDone(invocation.result);
 }
 
 /** Returns no result and does not call returnDone. */
 template <class Adapter>
-void modify(Request& request) {
-    Adapter adapter(request.broker, request.context, request.path);
-    adapter.modifyCMPIInstance(request.instance, request.properties);
+void modify(Invocation& invocation) {
+    Adapter adapter(invocation.broker, invocation.context, invocation.path);
+    adapter.modifyCMPIInstance(invocation.instance, invocation.properties);
 }
 
 /** Returns no result and does not call returnDone. */
 template <class Adapter>
-void remove(Request& request) {
-    Adapter adapter(request.broker, request.context, request.path);
+void remove(Invocation& invocation) {
+    Adapter adapter(invocation.broker, invocation.context, invocation.path);
     adapter.deleteCMPIInstance();
 }
 
-inline void notSupported(Request& request) {
-    request.status.rc = CMPI_RC_ERR_NOT_SUPPORTED;
+inline void notSupported(Invocation& invocation) {
+    invocation.status.rc = CMPI_RC_ERR_NOT_SUPPORTED;
 }
 
-inline void invalidClass(Request& request) {
-    request.status.rc = CMPI_RC_ERR_INVALID_CLASS;
+inline void invalidClass(Invocation& invocation) {
+    invocation.status.rc = CMPI_RC_ERR_INVALID_CLASS;
 }
 
 }  // namespace KO::LeaseWarrantyProvider::Handlers

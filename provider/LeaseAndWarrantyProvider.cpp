@@ -2,8 +2,8 @@
 
 #include "Dispatch.h"
 #include "KO/ProviderUtilities.h"
-#include "LoggerNames.h"
 #include "Trace.h"
+#include "cim/CmpiAccess.h"
 
 #include <exception>
 #include <string>
@@ -48,17 +48,19 @@ unsigned short classIdOf(const CallSite& site, Class requestedClass) {
     return classId;
 }
 
-/** Returns the namespace of a new instance; empty on failure. Writes the status that the request returns. */
-std::string nameSpaceOf(const CMPIObjectPath* ref, CMPIStatus& status) {
-    if (ref == nullptr) {
+/** Returns the namespace of a path; empty on failure. Writes the status that the entry point returns. */
+std::string nameSpaceOf(const CMPIObjectPath* path, CMPIStatus& status) {
+    if (path == nullptr) {
         return {};
     }
-    const CMPIString* text = ref->ft->getNameSpace(ref, &status);
-    if (status.rc != CMPI_RC_OK || text == nullptr) {
+    const auto nameSpace = cim::ask<&CMPIObjectPathFT::getNameSpace>(path);
+    status = nameSpace.status;
+    if (!nameSpace.isOk() || nameSpace.value == nullptr) {
         return {};
     }
-    const char* characters = text->ft->getCharPtr(text, &status);
-    return status.rc == CMPI_RC_OK && characters != nullptr ? characters : "";
+    const auto characters = cim::ask<&CMPIStringFT::getCharPtr>(nameSpace.value);
+    status = characters.status;
+    return characters.isOk() && characters.value != nullptr ? characters.value : "";
 }
 
 /**
@@ -68,18 +70,18 @@ std::string nameSpaceOf(const CMPIObjectPath* ref, CMPIStatus& status) {
  * since a message that a failing broker call wrote does not belong to the provider.
  */
 template <class Class>
-CMPIStatus serve(const CallSite& site, Operation operation, Class requestedClass, Request& request) {
+CMPIStatus serve(const CallSite& site, Handler ClassHandlers::*operation, Class requestedClass, Invocation invocation) {
     const EntryMarkers markers(site);
     try {
         const unsigned short classId = classIdOf(site, requestedClass);
-        if (operation == Operation::createInstance) {
-            request.nameSpace = nameSpaceOf(request.path, request.status);
+        if (operation == &ClassHandlers::createInstance) {
+            invocation.nameSpace = nameSpaceOf(invocation.path, invocation.status);
         }
-        bodyOf(operation, classId)(request);
+        (handlersOf(classId).*operation)(invocation);
     } catch (const std::exception& failure) {
         traceMessage(at(traceSource, Level::error, site.function), failure.what());
     }
-    return {request.status.rc, nullptr};
+    return {invocation.status.rc, nullptr};
 }
 
 /** Traces the call of an operation without a handler and returns its fixed status. */
@@ -94,39 +96,33 @@ CMPIStatus LeaseAndWarranty_Cleanup(CMPIInstanceMI*, const CMPIContext*, CMPIBoo
 
 CMPIStatus LeaseAndWarranty_EnumInstanceNames(CMPIInstanceMI*, const CMPIContext* ctx, const CMPIResult* result,
                                               const CMPIObjectPath* ref) {
-    Request request{broker, ctx, result, ref};
-    return serve(at(traceSource), Operation::enumInstanceNames, ref, request);
+    return serve(at(traceSource), &ClassHandlers::enumInstanceNames, ref, {broker, ctx, result, ref});
 }
 
 CMPIStatus LeaseAndWarranty_EnumInstances(CMPIInstanceMI*, const CMPIContext* ctx, const CMPIResult* result,
                                           const CMPIObjectPath* ref, const char** properties) {
-    Request request{broker, ctx, result, ref, properties};
-    return serve(at(traceSource), Operation::enumInstances, ref, request);
+    return serve(at(traceSource), &ClassHandlers::enumInstances, ref, {broker, ctx, result, ref, properties});
 }
 
 CMPIStatus LeaseAndWarranty_GetInstance(CMPIInstanceMI*, const CMPIContext* ctx, const CMPIResult* result,
                                         const CMPIObjectPath* ref, const char** properties) {
-    Request request{broker, ctx, result, ref, properties};
-    return serve(at(traceSource), Operation::getInstance, ref, request);
+    return serve(at(traceSource), &ClassHandlers::getInstance, ref, {broker, ctx, result, ref, properties});
 }
 
 CMPIStatus LeaseAndWarranty_CreateInstance(CMPIInstanceMI*, const CMPIContext* ctx, const CMPIResult* result,
                                            const CMPIObjectPath* ref, const CMPIInstance*) {
-    Request request{broker, ctx, result, ref};
-    return serve(at(traceSource), Operation::createInstance, ref, request);
+    return serve(at(traceSource), &ClassHandlers::createInstance, ref, {broker, ctx, result, ref});
 }
 
 CMPIStatus LeaseAndWarranty_ModifyInstance(CMPIInstanceMI*, const CMPIContext* ctx, const CMPIResult* result,
                                            const CMPIObjectPath* ref, const CMPIInstance* inst,
                                            const char** properties) {
-    Request request{broker, ctx, result, ref, properties, inst};
-    return serve(at(traceSource), Operation::modifyInstance, ref, request);
+    return serve(at(traceSource), &ClassHandlers::modifyInstance, ref, {broker, ctx, result, ref, properties, inst});
 }
 
 CMPIStatus LeaseAndWarranty_DeleteInstance(CMPIInstanceMI*, const CMPIContext* ctx, const CMPIResult* result,
                                            const CMPIObjectPath* ref) {
-    Request request{broker, ctx, result, ref};
-    return serve(at(traceSource), Operation::deleteInstance, ref, request);
+    return serve(at(traceSource), &ClassHandlers::deleteInstance, ref, {broker, ctx, result, ref});
 }
 
 CMPIStatus LeaseAndWarranty_ExecQuery(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*,
@@ -141,15 +137,13 @@ CMPIStatus LeaseAndWarranty_AssociationCleanup(CMPIAssociationMI*, const CMPICon
 CMPIStatus LeaseAndWarranty_Associators(CMPIAssociationMI*, const CMPIContext* ctx, const CMPIResult* result,
                                         const CMPIObjectPath* ref, const char* assocClass, const char*, const char*,
                                         const char*, const char** properties) {
-    Request request{broker, ctx, result, ref, properties};
-    return serve(at(traceSource), Operation::associators, assocClass, request);
+    return serve(at(traceSource), &ClassHandlers::associators, assocClass, {broker, ctx, result, ref, properties});
 }
 
 CMPIStatus LeaseAndWarranty_AssociatorNames(CMPIAssociationMI*, const CMPIContext* ctx, const CMPIResult* result,
                                             const CMPIObjectPath* ref, const char* assocClass, const char*, const char*,
                                             const char*) {
-    Request request{broker, ctx, result, ref};
-    return serve(at(traceSource), Operation::associatorNames, assocClass, request);
+    return serve(at(traceSource), &ClassHandlers::associatorNames, assocClass, {broker, ctx, result, ref});
 }
 
 CMPIStatus LeaseAndWarranty_References(CMPIAssociationMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*,

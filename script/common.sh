@@ -82,7 +82,8 @@ source_files() {
 
 # Prints the paths of the project's shell scripts in the same form.
 shell_scripts() {
-    git ls-files -z | xargs -0 awk '
+    # git grep passes over links to folders, which awk cannot read.
+    git grep -lzE '^#!.*sh$|shellcheck shell=' | xargs -0 awk '
         (FNR == 1 && /^#!.*sh$/) || (FNR == 2 && /shellcheck shell=/) { printf "%s%c", FILENAME, 0 }
         FNR == 2 { nextfile }'
 }

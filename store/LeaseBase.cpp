@@ -1,6 +1,5 @@
 #include "LeaseBase.h"
 
-#include "LoggerNames.h"
 #include "RecordBaseImpl.h"
 
 namespace KO::LeaseWarrantyProvider {
@@ -35,20 +34,13 @@ template class RecordCache<LeaseStoreTraits>;
 template class RecordBase<LeaseStoreTraits>;
 
 /** Defined after the logger's name and the tables, which its constructor uses. */
-LeaseCache LeaseBase::cache;
-
-LeaseCache& LeaseStoreTraits::cache() {
-    return LeaseBase::cache;
-}
+template <>
+LeaseCache RecordBase<LeaseStoreTraits>::cache{};
 
 std::ifstream& operator>>(std::ifstream& source, LeaseUnit& lease) {
     const Traced traced(at(LeaseStoreTraits::traceSource), label::source, &source, label::lease, &lease);
     readRecord(source, lease, LeaseStoreTraits::fields);
     return source;
-}
-
-std::size_t bytesOfTexts(const LeaseUnit& lease) {
-    return bytesOfTexts(lease, LeaseStoreTraits::fields);
 }
 
 std::ofstream& operator<<(std::ofstream& target, const LeaseUnit& lease) {

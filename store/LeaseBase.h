@@ -1,10 +1,9 @@
 #pragma once
 
-#include "LeaseUnit.h"
 #include "RecordBase.h"
-#include "RecordFields.h"
 
 #include <array>
+#include <fstream>
 #include <string>
 
 namespace KO::LeaseWarrantyProvider {
@@ -30,6 +29,35 @@ enum class Lease : int {
 
 }  // namespace Properties
 
+struct LeaseStoreTraits;
+
+/** The terms of one lease. Amounts of money are strings and are not parsed. */
+struct LeaseUnit : private RecordTrace<LeaseStoreTraits> {
+    LeaseUnit() = default;
+    explicit LeaseUnit(const std::string& instanceId) : RecordTrace(instanceId), InstanceID(instanceId) {}
+
+    bool inUse = true;  ///< false once deleted: the record stays in the table and is skipped
+    bool EarlyTerminationOption = false;
+    bool FixedPricePurchaseOption = false;
+    bool RenewalOption = false;
+    bool BargainRenewalOption = false;
+    unsigned int LeaseTerm = 0;
+    unsigned int NetMonthlyLeaseRateFactor = 0;
+    std::string InstanceID;  ///< key, unique among the records in use
+    std::string Lessor;
+    std::string BaseRent;
+    std::string BaseTermCommencementDate;  ///< CIM datetime string
+    std::string FairMarketRental;
+    std::string FairMarketValue;
+    std::string TerminationValue;
+};
+
+/** Reads one record of a lease file from the stream's position. A field that cannot be read keeps its value. */
+std::ifstream& operator>>(std::ifstream& source, LeaseUnit& lease);
+
+/** Writes one record of a lease file: thirteen fields, one per line, each line flushed. */
+std::ofstream& operator<<(std::ofstream& target, const LeaseUnit& lease);
+
 /** The number of leases in use, which is the first line of the file. */
 struct LeaseCount {
     unsigned int recordCountLease = 0;
@@ -46,7 +74,6 @@ struct LeaseStoreTraits {
     static const TraceSource traceSource;
     static const RecordStoreNames names;
     static const std::array<RecordField<Unit, Property>, 13> fields;
-    static RecordCache<LeaseStoreTraits>& cache();
 };
 
 /** The process-wide lease table, stored in Lease.dat. */
@@ -63,8 +90,9 @@ public:
     using RecordBase::setProperty;
     bool getProperty(Properties::Lease property, bool& value) const;
     void setProperty(Properties::Lease property, bool value);
-
-    static LeaseCache cache;
 };
+
+template <>
+LeaseCache RecordBase<LeaseStoreTraits>::cache;
 
 }  // namespace KO::LeaseWarrantyProvider

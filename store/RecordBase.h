@@ -2,6 +2,7 @@
 
 #include "FixedString.h"
 #include "IdentifierIndex.h"
+#include "RecordFields.h"
 #include "Trace.h"
 
 #include <cstddef>
@@ -47,6 +48,24 @@ struct RecordStoreNames {
 };
 
 /**
+ * Traces construction and copying of records. An empty base of the record types, which use compiler-generated copying.
+ * Does not trace destruction or moves, such as those of a growing table.
+ *
+ * Traits is the traits class of the records' store.
+ */
+template <class Traits>
+class RecordTrace {
+public:
+    RecordTrace();
+    explicit RecordTrace(const std::string& instanceId);
+    RecordTrace(const RecordTrace& instance);
+    RecordTrace& operator=(const RecordTrace& instance);
+    RecordTrace(RecordTrace&&) noexcept = default;
+    RecordTrace& operator=(RecordTrace&&) noexcept = default;
+    ~RecordTrace() = default;
+};
+
+/**
  * The table of one kind of records and its file. Base of LeaseCache and WarrantyCache. Loaded once, with the library;
  * each change rewrites the file. The count, whose name depends on the kind, is always the number of records in use.
  */
@@ -86,12 +105,13 @@ private:
  *   Count              base of the table with the record count, returned by count()
  *   traceSource, names trace source and RecordStoreNames of the store
  *   fields             its table of RecordField, in file order
- *   cache()            the process-wide table
  */
 template <class Traits>
 class RecordBase {
 public:
     using Property = typename Traits::Property;
+
+    static RecordCache<Traits> cache;  ///< the process-wide table
 
     /**
      * Starts at the first record in use, or at the end if the count is 0. Throws InstrumentationException if the count

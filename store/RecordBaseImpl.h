@@ -6,7 +6,6 @@
 #include "KO/Exceptions.h"
 #include "RecordBase.h"
 #include "RecordTable.h"
-#include "RecordTrace.h"
 
 #include <algorithm>
 #include <exception>
@@ -46,7 +45,7 @@ template <class Traits>
 RecordCache<Traits>::RecordCache() noexcept {
     const Traced traced(at(Traits::traceSource, Level::flow, Traits::names.cacheName));
     try {
-        loadRecords(dataFilePath(Traits::names.fileName), this->count(), table);
+        loadRecords(dataFilePath(Traits::names.fileName), this->count(), table, Traits::fields);
         index.update(table);
     } catch (const std::bad_alloc&) {
         abandonLoading(at(Traits::traceSource, Level::error, Traits::names.cacheName), recordsExceedMemory);
@@ -79,9 +78,8 @@ void RecordCache<Traits>::flushCache() {
 template <class Traits>
 RecordBase<Traits>::RecordBase() {
     const Traced traced(at(Traits::traceSource, Level::flow, Traits::names.baseName));
-    traceVariable(at(Traits::traceSource, Level::flow, Traits::names.baseName), Traits::names.countName,
-                  Traits::cache().count());
-    if (Traits::cache().count() == 0) {
+    traceVariable(at(Traits::traceSource, Level::flow, Traits::names.baseName), Traits::names.countName, cache.count());
+    if (cache.count() == 0) {
         return;
     }
     skipTo(0);
@@ -103,7 +101,7 @@ RecordBase<Traits>::~RecordBase() noexcept(false) {
 
 template <class Traits>
 void RecordBase<Traits>::skipTo(std::size_t index) {
-    const auto& table = Traits::cache().table;
+    const auto& table = cache.table;
     const auto inUse = [](const Unit& unit) { return unit.inUse; };
     const auto from = table.begin() + static_cast<std::ptrdiff_t>(std::min(index, table.size()));
     const auto found = std::find_if(from, table.end(), inUse);
@@ -113,7 +111,7 @@ void RecordBase<Traits>::skipTo(std::size_t index) {
 template <class Traits>
 void RecordBase<Traits>::rewrite(const CallSite& site) {
     try {
-        Traits::cache().flushCache();
+        cache.flushCache();
         cacheModified = false;
     } catch (const std::exception& failure) {
         if (std::uncaught_exceptions() == exceptionsBefore) {
@@ -149,7 +147,6 @@ void RecordBase<Traits>::select(const std::string& instanceId) {
 template <class Traits>
 void RecordBase<Traits>::skipTo(const std::string& instanceId) {
     if (cursor != end) {
-        const auto& cache = Traits::cache();
         cursor = cache.index.find(cache.table, instanceId, cursor);
     }
 }
@@ -163,17 +160,16 @@ template <class Traits>
 bool RecordBase<Traits>::create(const std::string& instanceId) {
     const CallSite site = at(Traits::traceSource, Level::flow, Traits::names.createName);
     const Traced traced(site, label::instanceId, instanceId);
-    auto& cache = Traits::cache();
     if (cache.index.find(cache.table, instanceId, 0) != cache.index.none) {
         fail<InstrumentationException>(here(site), Traits::names.identifierExists);
     }
-    const bool stoodOnEntry = cursor != end;
+    const bool wasAtRecord = cursor != end;
     cache.table.push_back(Unit(instanceId));
     cache.index.update(cache.table);
     ++cache.count();
     cacheModified = true;
     cursor = 0;
-    if (stoodOnEntry) {
+    if (wasAtRecord) {
         select(instanceId);
     }
     return true;
@@ -184,7 +180,6 @@ void RecordBase<Traits>::remove() {
     const CallSite site = at(Traits::traceSource, Level::flow, Traits::names.removeName);
     const Traced traced(site);
     requireCurrent(here(site));
-    auto& cache = Traits::cache();
     // The cursor stays at a deleted record; do not decrement the count for it again.
     cache.count() -= cache.table[cursor].inUse ? 1U : 0U;
     cache.table[cursor].inUse = false;
@@ -221,7 +216,7 @@ bool RecordBase<Traits>::get(const CallSite& site, Property property, Value& val
     if (member == nullptr) {
         fail<InstrumentationException>(site, wrongTypeOrProperty);
     }
-    value = Traits::cache().table[cursor].*member;
+    value = cache.table[cursor].*member;
     return true;
 }
 
@@ -234,7 +229,7 @@ void RecordBase<Traits>::set(const CallSite& site, Property property, const Valu
     if (member == nullptr) {
         fail<InstrumentationException>(site, wrongType);
     }
-    Traits::cache().table[cursor].*member = value;
+    cache.table[cursor].*member = value;
     cacheModified = true;
 }
 

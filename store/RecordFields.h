@@ -1,7 +1,6 @@
 #pragma once
 
 #include <array>
-#include <cstddef>
 #include <string>
 #include <variant>
 
@@ -11,12 +10,8 @@ namespace KO::LeaseWarrantyProvider {
 enum class TextForm {
     identifier,  ///< blanks as underscores; an empty string as an empty line
     value,       ///< blanks as underscores; a string of at most one character as "*"
-    date,        ///< unchanged; a string shorter than a CIM datetime as the default date
+    date,        ///< unchanged; a string shorter than a CIM datetime as cim::noDate
 };
-
-/** Value of an unset date in a record file. It has the length of any CIM datetime. */
-constexpr const char* defaultDate = "00000000000000.000000-000";
-constexpr std::size_t dateLength = 25;
 
 /**
  * A field of a record type: its property, its member and, for strings, its format in the record file. A table of the

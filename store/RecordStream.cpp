@@ -1,5 +1,7 @@
 #include "RecordStream.h"
 
+#include "cim/DateTime.h"
+
 #include <algorithm>
 #include <iterator>
 
@@ -39,8 +41,8 @@ bool extract(std::istream& stream, std::string& word) {
 }
 
 void writeEscaped(std::ostream& stream, const std::string& text, TextForm form) {
-    if (form == TextForm::date && text.size() < dateLength) {
-        stream << defaultDate;
+    if (form == TextForm::date && text.size() < cim::noDate.size()) {
+        stream << cim::noDate;
         return;
     }
     if (form == TextForm::value && text.size() <= 1) {

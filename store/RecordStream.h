@@ -43,7 +43,7 @@ void readRecord(std::istream& stream, Unit& unit, const Fields& fields) {
 
 /** Returns the heap memory of a record's strings in bytes. Short strings are stored in the record itself. */
 template <class Unit, class Fields>
-std::size_t bytesOfTexts(const Unit& unit, const Fields& fields) {
+std::size_t bytesOfStrings(const Unit& unit, const Fields& fields) {
     const std::size_t shortest = std::string().capacity();
     std::size_t bytes = 0;
     for (const auto& field : fields) {

@@ -38,8 +38,9 @@ void openRecordFile(Stream& stream, const std::string& path, std::ios::openmode 
  * Implements loadRecords. If the file declares more than reservedRecords records, reserves memory for `reserve` times
  * that number.
  */
-template <class Unit>
-void readRecords(const std::string& path, unsigned int& count, std::vector<Unit>& table, std::size_t reserve) {
+template <class Unit, class Fields>
+void readRecords(const std::string& path, unsigned int& count, std::vector<Unit>& table, const Fields& fields,
+                 std::size_t reserve) {
     table.reserve(reservedRecords);
     std::ifstream stream;
     openRecordFile(stream, path, std::ios::in);
@@ -62,7 +63,7 @@ void readRecords(const std::string& path, unsigned int& count, std::vector<Unit>
         stream >> scratch;
         if (!isAtEnd && !stream.good()) {  // all further records are copies
             isAtEnd = true;
-            requireMemory(declared - record, sizeof(Unit) + bytesOfTexts(scratch));
+            requireMemory(declared - record, sizeof(Unit) + bytesOfStrings(scratch, fields));
         }
         table.push_back(scratch);
     }
@@ -77,18 +78,19 @@ void readRecords(const std::string& path, unsigned int& count, std::vector<Unit>
  * memory for twice the number of records or, if that fails, for the number of records.
  *
  * @param count receives the number of records; unchanged, like the table, if the file is unreadable
+ * @param fields the table of RecordField of the records
  * @throws std::bad_alloc if the declared records, or the copies of the last one read, do not fit into memory or an
  *         allocation fails
  * @throws std::ios_base::failure if the file cannot be read to its end. In both cases the table may contain some
  *         records.
  */
-template <class Unit>
-void loadRecords(const std::string& path, unsigned int& count, std::vector<Unit>& table) {
+template <class Unit, class Fields>
+void loadRecords(const std::string& path, unsigned int& count, std::vector<Unit>& table, const Fields& fields) {
     try {
-        readRecords(path, count, table, 2);
+        readRecords(path, count, table, fields, 2);
     } catch (const std::bad_alloc&) {
         std::vector<Unit>().swap(table);
-        readRecords(path, count, table, 1);
+        readRecords(path, count, table, fields, 1);
     }
 }
 

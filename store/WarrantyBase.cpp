@@ -1,6 +1,5 @@
 #include "WarrantyBase.h"
 
-#include "LoggerNames.h"
 #include "RecordBaseImpl.h"
 
 namespace KO::LeaseWarrantyProvider {
@@ -26,20 +25,13 @@ template class RecordCache<WarrantyStoreTraits>;
 template class RecordBase<WarrantyStoreTraits>;
 
 /** Defined after the logger's name and the tables, which its constructor uses. */
-WarrantyCache WarrantyBase::cache;
-
-WarrantyCache& WarrantyStoreTraits::cache() {
-    return WarrantyBase::cache;
-}
+template <>
+WarrantyCache RecordBase<WarrantyStoreTraits>::cache{};
 
 std::ifstream& operator>>(std::ifstream& source, WarrantyUnit& warranty) {
     const Traced traced(at(WarrantyStoreTraits::traceSource), label::source, &source, label::warranty, &warranty);
     readRecord(source, warranty, WarrantyStoreTraits::fields);
     return source;
-}
-
-std::size_t bytesOfTexts(const WarrantyUnit& warranty) {
-    return bytesOfTexts(warranty, WarrantyStoreTraits::fields);
 }
 
 std::ofstream& operator<<(std::ofstream& target, const WarrantyUnit& warranty) {

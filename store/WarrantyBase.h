@@ -1,10 +1,9 @@
 #pragma once
 
 #include "RecordBase.h"
-#include "RecordFields.h"
-#include "WarrantyUnit.h"
 
 #include <array>
+#include <fstream>
 #include <string>
 
 namespace KO::LeaseWarrantyProvider {
@@ -20,6 +19,26 @@ enum class Warranty : int {
 };
 
 }  // namespace Properties
+
+struct WarrantyStoreTraits;
+
+/** The terms of one warranty. */
+struct WarrantyUnit : private RecordTrace<WarrantyStoreTraits> {
+    WarrantyUnit() = default;
+    explicit WarrantyUnit(const std::string& instanceId) : RecordTrace(instanceId), InstanceID(instanceId) {}
+
+    bool inUse = true;  ///< false once deleted: the record stays in the table and is skipped
+    unsigned int Duration = 0;
+    std::string InstanceID;  ///< key, unique among the records in use
+    std::string Warrantor;
+    std::string CommencementDate;  ///< CIM datetime string
+};
+
+/** Reads one record of a warranty file from the stream's position. A field that cannot be read keeps its value. */
+std::ifstream& operator>>(std::ifstream& source, WarrantyUnit& warranty);
+
+/** Writes one record of a warranty file: four fields, one per line, each line flushed. */
+std::ofstream& operator<<(std::ofstream& target, const WarrantyUnit& warranty);
 
 /** The number of warranties in use, which is the first line of the file. */
 struct WarrantyCount {
@@ -37,7 +56,6 @@ struct WarrantyStoreTraits {
     static const TraceSource traceSource;
     static const RecordStoreNames names;
     static const std::array<RecordField<Unit, Property>, 4> fields;
-    static RecordCache<WarrantyStoreTraits>& cache();
 };
 
 /** The process-wide warranty table, stored in Warranty.dat. */
@@ -49,8 +67,9 @@ public:
     void selectWarranty(const std::string& instanceId) { select(instanceId); }
     bool createWarranty(const std::string& instanceId) { return create(instanceId); }
     void deleteWarranty() { remove(); }
-
-    static WarrantyCache cache;
 };
+
+template <>
+WarrantyCache RecordBase<WarrantyStoreTraits>::cache;
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -2,6 +2,7 @@
 #include "Export.h"
 #include "KO/ClassIds.h"
 #include "KO/ProviderUtilities.h"
+#include "cim/CmpiAccess.h"
 
 #include <cmpift.h>
 
@@ -17,26 +18,22 @@ namespace {
 std::atomic<const CMPIBroker*> theBroker{nullptr};
 
 CMPIStatus status(CMPIrc code, const char* message = nullptr) {
-    const CMPIBroker* broker = theBroker;
-    const bool canSay =
-        message != nullptr && broker != nullptr && broker->eft != nullptr && broker->eft->newString != nullptr;
-    return {code, canSay ? broker->eft->newString(broker, message, nullptr) : nullptr};
+    return {code, message != nullptr ? cim::make<&CMPIBrokerEncFT::newString>(theBroker.load(), message) : nullptr};
 }
 
-CMPIStatus ok() {
-    return status(CMPI_RC_OK);
-}
-CMPIStatus notSupported() {
+/** The entry point of each operation that would change the computers, and of queries. */
+template <typename... Arguments>
+CMPIStatus notSupported(Arguments...) {
     return status(CMPI_RC_ERR_NOT_SUPPORTED);
 }
 
-/** Broker, result and namespace of a request. */
-struct Request {
+/** Returns computers to the client of a request. */
+struct ResultWriter {
     const CMPIBroker* broker;
     const CMPIResult* result;
     std::string nameSpace;
 
-    Request(const CMPIResult* itsResult, const CMPIObjectPath* path)
+    ResultWriter(const CMPIResult* itsResult, const CMPIObjectPath* path)
         : broker(theBroker), result(itsResult), nameSpace(ProviderUtilities::getNamespace(path)) {}
 
     CMPIStatus returnPath(const Computer& computer) const {
@@ -74,34 +71,33 @@ CMPIStatus guarded(const CMPIObjectPath* path, const Handler& handler) noexcept 
 
 /** Returns all computers, one by one, until one fails. */
 template <typename Return>
-CMPIStatus returnAll(const Request& request, const Return& returnOne) {
+CMPIStatus returnAll(const ResultWriter& writer, const Return& returnOne) {
     for (const Computer& computer : allComputers()) {
         const CMPIStatus answer = returnOne(computer);
         if (answer.rc != CMPI_RC_OK) {
             return answer;
         }
     }
-    return request.done();
+    return writer.done();
 }
 
 CMPIStatus cleanup(CMPIInstanceMI* /*mi*/, const CMPIContext* /*context*/, CMPIBoolean /*terminating*/) {
-    return ok();
+    return status(CMPI_RC_OK);
 }
 
 CMPIStatus enumerateInstanceNames(CMPIInstanceMI* /*mi*/, const CMPIContext* /*context*/, const CMPIResult* result,
                                   const CMPIObjectPath* path) {
     return guarded(path, [&] {
-        const Request request(result, path);
-        return returnAll(request, [&](const Computer& computer) { return request.returnPath(computer); });
+        const ResultWriter writer(result, path);
+        return returnAll(writer, [&](const Computer& computer) { return writer.returnPath(computer); });
     });
 }
 
 CMPIStatus enumerateInstances(CMPIInstanceMI* /*mi*/, const CMPIContext* /*context*/, const CMPIResult* result,
                               const CMPIObjectPath* path, const char** properties) {
     return guarded(path, [&] {
-        const Request request(result, path);
-        return returnAll(request,
-                         [&](const Computer& computer) { return request.returnInstance(computer, properties); });
+        const ResultWriter writer(result, path);
+        return returnAll(writer, [&](const Computer& computer) { return writer.returnInstance(computer, properties); });
     });
 }
 
@@ -112,50 +108,22 @@ CMPIStatus getInstance(CMPIInstanceMI* /*mi*/, const CMPIContext* /*context*/, c
         if (!ProviderUtilities::getKeyProperty(path, "Name", name)) {
             return status(CMPI_RC_ERR_INVALID_PARAMETER, "The key Name is missing or is not a string");
         }
-        const Request request(result, path);
+        const ResultWriter writer(result, path);
         for (const Computer& computer : allComputers()) {
             if (computer.name == name) {
-                const CMPIStatus answer = request.returnInstance(computer, properties);
-                return answer.rc == CMPI_RC_OK ? request.done() : answer;
+                const CMPIStatus answer = writer.returnInstance(computer, properties);
+                return answer.rc == CMPI_RC_OK ? writer.done() : answer;
             }
         }
         return status(CMPI_RC_ERR_NOT_FOUND, ("There is no computer system named \"" + name + "\"").c_str());
     });
 }
 
-CMPIStatus createInstance(CMPIInstanceMI* /*mi*/, const CMPIContext* /*context*/, const CMPIResult* /*result*/,
-                          const CMPIObjectPath* /*path*/, const CMPIInstance* /*instance*/) {
-    return notSupported();
-}
-
-CMPIStatus modifyInstance(CMPIInstanceMI* /*mi*/, const CMPIContext* /*context*/, const CMPIResult* /*result*/,
-                          const CMPIObjectPath* /*path*/, const CMPIInstance* /*instance*/,
-                          const char** /*properties*/) {
-    return notSupported();
-}
-
-CMPIStatus deleteInstance(CMPIInstanceMI* /*mi*/, const CMPIContext* /*context*/, const CMPIResult* /*result*/,
-                          const CMPIObjectPath* /*path*/) {
-    return notSupported();
-}
-
-CMPIStatus execQuery(CMPIInstanceMI* /*mi*/, const CMPIContext* /*context*/, const CMPIResult* /*result*/,
-                     const CMPIObjectPath* /*path*/, const char* /*language*/, const char* /*query*/) {
-    return notSupported();
-}
-
 CMPIInstanceMIFT functions = {
-    CMPIVersion200,
-    CMPIVersion200,
-    "instanceOstrelComputerSystemProvider",
-    cleanup,
-    enumerateInstanceNames,
-    enumerateInstances,
-    getInstance,
-    createInstance,
-    modifyInstance,
-    deleteInstance,
-    execQuery,
+    CMPIVersion200, CMPIVersion200,         "instanceOstrelComputerSystemProvider",
+    cleanup,        enumerateInstanceNames, enumerateInstances,
+    getInstance,    notSupported,           notSupported,
+    notSupported,   notSupported,
 };
 
 CMPIInstanceMI instanceMI = {nullptr, &functions};

@@ -2,8 +2,6 @@
 
 #include "cim/Utf8.h"
 #include "configuration/FileContent.h"
-#include "configuration/Toml.h"
-#include "configuration/TomlNesting.h"
 
 #include <toml.hpp>
 

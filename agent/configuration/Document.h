@@ -2,7 +2,9 @@
 
 #include "configuration/TableReader.h"
 
+#include <cstddef>
 #include <memory>
+#include <optional>
 #include <string>
 #include <string_view>
 
@@ -43,5 +45,14 @@ private:
     std::unique_ptr<Content> content;
     std::string whatIsWrong;
 };
+
+/** Maximum depth of nested brackets, and maximum number of dots in a key. */
+constexpr int deepestNesting = 16;
+
+/**
+ * Returns the first line of a TOML document in which brackets or the parts of a key are nested deeper. The TOML
+ * parser recurses for each level and would overflow the stack.
+ */
+std::optional<std::size_t> lineNestedTooDeep(std::string_view document);
 
 }  // namespace Agent

@@ -1,7 +1,5 @@
 #include "configuration/FileContent.h"
 
-#include "configuration/FileDescriptor.h"
-
 #include <fcntl.h>
 #include <unistd.h>
 

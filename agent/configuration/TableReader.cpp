@@ -13,8 +13,20 @@ const TomlTable& emptyTable() {
     return table;
 }
 
+bool isString(const TomlValue& value) {
+    return value.is_string();
+}
+
+bool isFlag(const TomlValue& value) {
+    return value.is_boolean();
+}
+
 bool isTable(const TomlValue& value) {
     return value.is_table();
+}
+
+bool isArrayOfTables(const TomlValue& value) {
+    return value.is_array() && std::all_of(value.as_array().begin(), value.as_array().end(), isTable);
 }
 
 }  // namespace
@@ -28,20 +40,23 @@ const TomlValue* TableReader::find(std::string_view key) {
     return entry != source->end() ? &entry->second : nullptr;
 }
 
+template <class IsValid>
+const TomlValue* TableReader::find(std::string_view key, IsValid isValid, const std::string& requirement) {
+    const TomlValue* value = find(key);
+    if (value != nullptr && !isValid(*value)) {
+        reject(key, requirement);
+        return nullptr;
+    }
+    return value;
+}
+
 bool TableReader::has(std::string_view key) {
     return find(key) != nullptr;
 }
 
 std::optional<std::string> TableReader::string(std::string_view key) {
-    const TomlValue* value = find(key);
-    if (value == nullptr) {
-        return std::nullopt;
-    }
-    if (!value->is_string()) {
-        reject(key, "must be a string");
-        return std::nullopt;
-    }
-    return value->as_string().str;
+    const TomlValue* value = find(key, isString, "must be a string");
+    return value != nullptr ? std::optional<std::string>(value->as_string().str) : std::nullopt;
 }
 
 std::optional<std::string> TableReader::nonEmptyString(std::string_view key) {
@@ -54,51 +69,30 @@ std::optional<std::string> TableReader::nonEmptyString(std::string_view key) {
 }
 
 std::optional<bool> TableReader::flag(std::string_view key) {
-    const TomlValue* value = find(key);
-    if (value == nullptr) {
-        return std::nullopt;
-    }
-    if (!value->is_boolean()) {
-        reject(key, "must be true or false");
-        return std::nullopt;
-    }
-    return value->as_boolean();
+    const TomlValue* value = find(key, isFlag, "must be true or false");
+    return value != nullptr ? std::optional<bool>(value->as_boolean()) : std::nullopt;
 }
 
 std::optional<std::int64_t> TableReader::number(std::string_view key, std::int64_t minimum, std::int64_t maximum) {
-    const TomlValue* value = find(key);
-    if (value == nullptr) {
-        return std::nullopt;
-    }
-    if (!value->is_integer() || value->as_integer() < minimum || value->as_integer() > maximum) {
-        reject(key, "must be an integer from " + std::to_string(minimum) + " to " + std::to_string(maximum));
-        return std::nullopt;
-    }
-    return value->as_integer();
+    const auto isInRange = [&](const TomlValue& value) {
+        return value.is_integer() && value.as_integer() >= minimum && value.as_integer() <= maximum;
+    };
+    const TomlValue* value =
+        find(key, isInRange, "must be an integer from " + std::to_string(minimum) + " to " + std::to_string(maximum));
+    return value != nullptr ? std::optional<std::int64_t>(value->as_integer()) : std::nullopt;
 }
 
 TableReader TableReader::table(std::string_view key) {
-    const TomlValue* value = find(key);
-    if (value != nullptr && !value->is_table()) {
-        reject(key, "must be a table");
-        value = nullptr;
-    }
+    const TomlValue* value = find(key, isTable, "must be a table");
     return TableReader(value != nullptr ? &value->as_table() : nullptr, nameOf(key), *problems);
 }
 
 std::vector<TableReader> TableReader::tables(std::string_view key) {
     std::vector<TableReader> readers;
-    const TomlValue* array = find(key);
-    if (array == nullptr) {
-        return readers;
-    }
-    if (!array->is_array() || !std::all_of(array->as_array().begin(), array->as_array().end(), isTable)) {
-        reject(key, "must be an array of tables");
-        return readers;
-    }
-    for (const TomlValue& value : array->as_array()) {
-        const std::string name = nameOf(key) + "[" + std::to_string(readers.size()) + "]";
-        readers.emplace_back(&value.as_table(), name, *problems);
+    const TomlValue* array = find(key, isArrayOfTables, "must be an array of tables");
+    for (std::size_t index = 0; array != nullptr && index < array->as_array().size(); ++index) {
+        const std::string name = nameOf(key) + "[" + std::to_string(index) + "]";
+        readers.emplace_back(&array->as_array()[index].as_table(), name, *problems);
     }
     return readers;
 }

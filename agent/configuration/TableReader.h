@@ -1,15 +1,25 @@
 #pragma once
 
-#include "configuration/Toml.h"
-
 #include <cstdint>
+#include <map>
 #include <optional>
 #include <string>
 #include <string_view>
 #include <utility>
 #include <vector>
 
+// Declared here so that only the files that parse or read values include the library.
+namespace toml {
+struct discard_comments;
+template <typename Comments, template <typename...> class Table, template <typename...> class Array>
+class basic_value;
+}  // namespace toml
+
 namespace Agent {
+
+/** A value of the configuration file; its tables are sorted by key. */
+using TomlValue = toml::basic_value<toml::discard_comments, std::map, std::vector>;
+using TomlTable = std::map<std::string, TomlValue>;
 
 /** Problems of a configuration, one sentence each, in the order in which they were found. */
 using Problems = std::vector<std::string>;
@@ -55,6 +65,10 @@ public:
 private:
     /** Returns the value of a key, null if there is none, and marks the key as known. */
     const TomlValue* find(std::string_view key);
+
+    /** Also returns null for a value that is not valid, and records a problem with the requirement. */
+    template <class IsValid>
+    const TomlValue* find(std::string_view key, IsValid isValid, const std::string& requirement);
     std::string nameOf(std::string_view key) const;
 
     const TomlTable* source;

@@ -1,4 +1,4 @@
-#include "framework/AgentSettings.h"
+#include "framework/AgentState.h"
 
 #include <systemd/sd-id128.h>
 

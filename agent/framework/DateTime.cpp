@@ -1,9 +1,10 @@
 #include "KO/DateTime.h"
 
+#include "KO/Utils.h"
 #include "cim/DateTime.h"
-#include "framework/DateTimeAccess.h"
 
 #include <ctime>
+#include <utility>
 
 namespace KO {
 
@@ -38,16 +39,25 @@ DateTime& DateTime::operator=(const DateTime& other) {
     return *this;
 }
 
-std::string DateTimeAccess::text(const DateTime& date) {
-    return date.implementation->text;
+std::string Utils::convertCIMDateTime(DateTime value) {
+    const std::string& text = value.implementation->text;
+    return text.empty() ? std::string(cim::noDate) : text;
 }
 
-DateTime DateTimeAccess::fromText(const std::string& text) {
+DateTime Utils::convertStringToDateTime(std::string text) {
     DateTime date;
     if (cim::isPointInTime(text)) {
-        date.implementation->text = text;
+        date.implementation->text = std::move(text);
     }
     return date;
+}
+
+DateTime Utils::ReadDateFromFile(PropertyFile& file, const std::string& key) {
+    return convertStringToDateTime(ReadStringFromFile(file, key));
+}
+
+void Utils::WriteDateToFile(PropertyFile& file, const std::string& key, const DateTime& value) {
+    WriteStringToFile(file, key, value.implementation->text);
 }
 
 }  // namespace KO

@@ -1,7 +1,7 @@
 #include "KO/File.h"
 
 #include "KO/Strings.h"
-#include "framework/OpenFile.h"
+#include "framework/FileAccess.h"
 
 #include <sys/stat.h>
 

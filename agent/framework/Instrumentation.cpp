@@ -1,7 +1,6 @@
 #include "KO/Instrumentation.h"
 
 #include "framework/AgentState.h"
-#include "framework/NodePath.h"
 
 #include <vector>
 

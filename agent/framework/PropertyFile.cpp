@@ -2,11 +2,10 @@
 
 #include "KO/Exceptions.h"
 #include "KO/Strings.h"
+#include "KO/Utils.h"
 #include "configuration/FileContent.h"
-#include "framework/OpenFile.h"
-#include "framework/PropertyFileAccess.h"
+#include "framework/FileAccess.h"
 #include "framework/PropertyText.h"
-#include "framework/ReplacementFile.h"
 
 #include <utility>
 
@@ -54,11 +53,11 @@ void PropertyFile::close() {
     }
 }
 
-std::string PropertyFileAccess::read(const PropertyFile& file, const std::string& key) {
+std::string Utils::ReadStringFromFile(PropertyFile& file, const std::string& key) {
     return file.implementation->openContent().get(key).value_or(std::string());
 }
 
-void PropertyFileAccess::write(PropertyFile& file, const std::string& key, const std::string& value) {
+void Utils::WriteStringToFile(PropertyFile& file, const std::string& key, const std::string& value) {
     PropertyFile::Implementation& implementation = *file.implementation;
     PropertyText& content = implementation.openContent();
     if (!implementation.writable) {

@@ -8,6 +8,8 @@ namespace {
 
 constexpr std::string_view hexDigits = "0123456789ABCDEF";
 constexpr std::string_view blanks = " \t\r";
+constexpr std::string_view namedBytes = "\\\n\r";  // with an escape of one letter
+constexpr std::string_view namesOfBytes = "\\nr";  // in the same order
 
 std::string_view trim(std::string_view text) {
     const std::size_t first = text.find_first_not_of(blanks);
@@ -34,12 +36,10 @@ std::string escape(const std::string& plain, std::string_view alsoEscaped) {
     for (std::size_t index = 0; index < plain.size(); ++index) {
         const char byte = plain[index];
         const bool blankAtEnd = byte == ' ' && (index == 0 || index + 1 == plain.size());
-        if (byte == '\\') {
-            text += "\\\\";
-        } else if (byte == '\n') {
-            text += "\\n";
-        } else if (byte == '\r') {
-            text += "\\r";
+        const std::size_t named = namedBytes.find(byte);
+        if (named != std::string_view::npos) {
+            text += '\\';
+            text += namesOfBytes[named];
         } else if (isControl(byte) || blankAtEnd || alsoEscaped.find(byte) != std::string_view::npos) {
             appendByteEscape(text, byte);
         } else {
@@ -54,9 +54,9 @@ std::size_t decodeEscape(std::string_view text, char& byte) {
     if (text.size() < 2 || text[0] != '\\') {
         return 0;
     }
-    const std::size_t simple = std::string_view("\\nr").find(text[1]);
-    if (simple != std::string_view::npos) {
-        byte = "\\\n\r"[simple];
+    const std::size_t named = namesOfBytes.find(text[1]);
+    if (named != std::string_view::npos) {
+        byte = namedBytes[named];
         return 2;
     }
     if (text[1] != 'x' || text.size() < 4) {

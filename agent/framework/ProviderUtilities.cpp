@@ -2,18 +2,21 @@
 
 #include "KO/ClassIds.h"
 #include "KO/Moniker.h"
+#include "cim/CmpiAccess.h"
 #include "cim/DateTime.h"
 #include "cim/Names.h"
-#include "framework/CmpiValue.h"
 
 #include <algorithm>
+#include <charconv>
+#include <optional>
+#include <system_error>
 
 namespace KO {
 
 namespace {
 
 struct ClassEntry {
-    const char* className;
+    const char* name;
     unsigned short id;
 };
 
@@ -60,6 +63,47 @@ CMPIDateTime* makeDateTime(const CMPIBroker* broker, const std::string& text) {
     return cim::make<&CMPIBrokerEncFT::newDateTimeFromChars>(broker, text.c_str());
 }
 
+bool isPresent(const CMPIData& data, const CMPIStatus& status, CMPIType type) {
+    return status.rc == CMPI_RC_OK && cim::hasValue(data) && data.type == type;
+}
+
+/** @name Values read from a broker
+ * None when the reading failed, the value is null, or it is of another type.
+ */
+///@{
+std::optional<std::string> stringOf(const CMPIData& data, const CMPIStatus& status) {
+    const bool isString = isPresent(data, status, CMPI_string) || isPresent(data, status, CMPI_chars);
+    return isString ? cim::charactersOf(data) : std::nullopt;
+}
+
+std::optional<std::string> dateTimeOf(const CMPIData& data, const CMPIStatus& status) {
+    return isPresent(data, status, CMPI_dateTime) ? cim::charactersOf(data) : std::nullopt;
+}
+
+std::optional<unsigned int> numberOf(const CMPIData& data, const CMPIStatus& status) {
+    const auto digits = isPresent(data, status, data.type) ? cim::digitsOf(data) : std::nullopt;
+    unsigned int number = 0;
+    const bool fits =
+        digits && std::from_chars(digits->data(), digits->data() + digits->size(), number).ec == std::errc();
+    return fits ? std::optional<unsigned int>(number) : std::nullopt;
+}
+
+std::optional<bool> flagOf(const CMPIData& data, const CMPIStatus& status) {
+    return isPresent(data, status, CMPI_boolean) ? std::optional<bool>(data.value.boolean != 0) : std::nullopt;
+}
+
+/** A string, an integer in decimal digits, or a boolean as "true" or "false". */
+std::optional<std::string> keyOf(const CMPIData& data, const CMPIStatus& status) {
+    const bool isKeyType = data.type != CMPI_dateTime && isPresent(data, status, data.type);
+    return isKeyType ? cim::charactersOf(data) : std::nullopt;
+}
+
+/** A reference; null for none. It belongs to the broker. */
+CMPIObjectPath* referenceOf(const CMPIData& data, const CMPIStatus& status) {
+    return isPresent(data, status, CMPI_ref) ? data.value.ref : nullptr;
+}
+///@}
+
 /** Assigns a value if there is one. @return whether there is one */
 template <typename Value>
 bool deliver(std::optional<Value> found, Value& value) {
@@ -77,14 +121,8 @@ unsigned short ProviderUtilities::getClassId(const CMPIObjectPath* path) {
 }
 
 unsigned short ProviderUtilities::getClassId(const char* className) {
-    if (className != nullptr) {
-        for (const ClassEntry& entry : classIds) {
-            if (cim::sameName(entry.className, className)) {
-                return entry.id;
-            }
-        }
-    }
-    return ClassId::unknown;
+    const ClassEntry* entry = className != nullptr ? cim::findNamed(classIds, className) : nullptr;
+    return entry != nullptr ? entry->id : ClassId::unknown;
 }
 
 std::string ProviderUtilities::getNamespace(const CMPIObjectPath* path) {
@@ -98,7 +136,7 @@ unsigned short ProviderUtilities::getKeyCount(const CMPIObjectPath* path) {
 
 bool ProviderUtilities::getKeyProperty(const CMPIObjectPath* path, const char* name, std::string& value) {
     const auto [data, status] = getKey(path, name);
-    return deliver(textOf(data, status), value);
+    return deliver(stringOf(data, status), value);
 }
 
 bool ProviderUtilities::getKeyProperty(const CMPIObjectPath* path, const char* name, CMPIObjectPath** value) {
@@ -179,7 +217,7 @@ void ProviderUtilities::setProperty(const CMPIBroker* broker, CMPIInstance* inst
 bool ProviderUtilities::getProperty(const CMPIInstance* instance, const char* name, std::string& value,
                                     bool /*isDateTime*/) {
     const auto [data, status] = getPropertyData(instance, name);
-    return deliver(dateTimeTextOf(data, status), value) || deliver(textOf(data, status), value);
+    return deliver(dateTimeOf(data, status), value) || deliver(stringOf(data, status), value);
 }
 
 bool ProviderUtilities::getProperty(const CMPIInstance* instance, const char* name, unsigned int& value) {
@@ -198,7 +236,7 @@ void ProviderUtilities::transformObjectPathToMoniker(const CMPIObjectPath* path,
         CMPIString* nameString = nullptr;
         const auto key = cim::ask<&CMPIObjectPathFT::getKeyAt>(path, index, &nameString);
         const std::optional<std::string> name = cim::charactersOf(nameString);
-        const std::optional<std::string> value = keyTextOf(key.value, key.status);
+        const std::optional<std::string> value = keyOf(key.value, key.status);
         if (name && value) {
             moniker.addKey(*name, *value);
         }

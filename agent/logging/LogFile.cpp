@@ -1,6 +1,6 @@
-#include "logging/LogFile.h"
+#include "logging/Sinks.h"
 
-#include "configuration/FileDescriptor.h"
+#include "configuration/FileContent.h"
 
 #include <fcntl.h>
 #include <sys/stat.h>

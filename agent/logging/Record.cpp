@@ -45,23 +45,14 @@ void appendEscapedByte(std::string& line, char byte) {
 }
 
 void appendEscapedCharacter(std::string& line, std::string_view character) {
-    switch (character.front()) {
-        case '\t':
-            line += "\\t";
-            return;
-        case '\n':
-            line += "\\n";
-            return;
-        case '\r':
-            line += "\\r";
-            return;
-        case '\\':
-            line += "\\\\";
-            return;
-        default:
-            for (const char byte : character) {
-                appendEscapedByte(line, byte);
-            }
+    const std::size_t named = std::string_view("\t\n\r\\").find(character.front());
+    if (named != std::string_view::npos) {
+        line += '\\';
+        line += "tnr\\"[named];
+        return;
+    }
+    for (const char byte : character) {
+        appendEscapedByte(line, byte);
     }
 }
 

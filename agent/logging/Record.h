@@ -11,6 +11,9 @@ namespace RZLog {
 /** The logger of the agent's libraries. */
 constexpr const char* ownLogger = "Ostrel.Agent";
 
+/** The level of errors. */
+constexpr int errorLevel = 3000;
+
 /** One record. Does not own its strings. */
 struct Record {
     Channel channel = Channel::log;

@@ -4,6 +4,7 @@
 #include "logging/Record.h"
 
 #include <memory>
+#include <string>
 
 namespace RZLog {
 
@@ -20,10 +21,29 @@ public:
 };
 
 /**
- * Opens the destination of the settings.
- * @return null if there is none
- * @throws std::exception if it cannot be opened
+ * Opens the sink that appends each record as one line to the log file of the settings. When a record would make the
+ * file larger than the rotation size, the file is renamed and a new one is begun.
+ * @throws std::system_error if the file cannot be opened or is not an ordinary file
  */
-std::unique_ptr<Sink> openSink(const LogSettings& settings);
+std::unique_ptr<Sink> openLogFile(const LogSettings& settings);
+
+/**
+ * The sinks of the system log and of systemd's journal. Each sends one datagram per record to the service's socket.
+ * They do not use syslog(3) or sd_journal_send(3), which block while the service does not read. A record that the
+ * service does not receive at once is dropped. Dropped records are counted, and the count is reported before the next
+ * record that is sent. Longer records are truncated to longestText.
+ *
+ * @param settings   the levels, which decide whether the library's own logger reports dropped records
+ * @param socketPath the service's socket, looked up for each record
+ * @throws std::system_error if no socket can be created
+ */
+///@{
+std::unique_ptr<Sink> openSystemLog(const LogSettings& settings, const std::string& socketPath = "/dev/log");
+std::unique_ptr<Sink> openJournal(const LogSettings& settings,
+                                  const std::string& socketPath = "/run/systemd/journal/socket");
+///@}
+
+/** Maximum number of bytes of a record that fit into a datagram on every system. */
+constexpr std::size_t longestText = 100000;
 
 }  // namespace RZLog

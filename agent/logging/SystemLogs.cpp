@@ -1,6 +1,7 @@
-#include "logging/SystemLogs.h"
+#include "logging/Sinks.h"
 
-#include "configuration/FileDescriptor.h"
+#include "cim/Utf8.h"
+#include "configuration/FileContent.h"
 
 #include <sys/socket.h>
 #include <sys/un.h>
@@ -14,8 +15,6 @@
 namespace RZLog {
 
 namespace {
-
-constexpr int errorLevel = 3000;
 
 /** A socket that sends datagrams to a path and never waits. */
 class DatagramSocket {
@@ -43,7 +42,7 @@ private:
 std::string cut(std::string text) {
     if (text.size() > longestText) {
         std::size_t end = longestText;
-        while (end > 0 && (static_cast<unsigned char>(text[end]) & 0xC0U) == 0x80U) {  // continuation byte of UTF-8
+        while (end > 0 && cim::continuesCharacter(text[end])) {
             --end;
         }
         text.resize(end);

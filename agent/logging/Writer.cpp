@@ -37,6 +37,21 @@ struct OutputOwner {
     }
 } outputOwner;
 
+/** Opens the destination of the settings. @return null if there is none  @throws std::exception on failure */
+std::unique_ptr<Sink> openSink(const LogSettings& settings) {
+    switch (settings.destination) {
+        case LogSettings::Destination::file:
+            return openLogFile(settings);
+        case LogSettings::Destination::syslog:
+            return openSystemLog(settings);
+        case LogSettings::Destination::journal:
+            return openJournal(settings);
+        case LogSettings::Destination::none:
+            break;
+    }
+    return nullptr;
+}
+
 Sink* openOutput() {
     const auto now = std::chrono::steady_clock::now();
     if (output->sink == nullptr && now >= output->nextOpening) {
@@ -57,11 +72,10 @@ void writeUnlessFailing(const Record& record) noexcept {
 }
 
 void reportProblems(const Agent::Problems& problems, const Levels& levels) {
-    constexpr int level = 3000;
     for (const std::string& problem : problems) {
         for (const Channel channel : {Channel::log, Channel::trace}) {
-            if (levels.admit(channel, ownLogger, level)) {
-                write({channel, level, ownLogger, "configure", "Writer.cpp", __LINE__, problem});
+            if (levels.admit(channel, ownLogger, errorLevel)) {
+                write({channel, errorLevel, ownLogger, "configure", "Writer.cpp", __LINE__, problem});
             }
         }
     }

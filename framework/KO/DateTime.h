@@ -6,7 +6,7 @@
 
 namespace KO {
 
-class DateTimeAccess;
+class Utils;
 
 /**
  * A point in time with its offset from UTC, or an unset date. KO::Utils converts it to and from the 25-character CIM
@@ -29,7 +29,7 @@ public:
     ~DateTime();
 
 private:
-    friend class DateTimeAccess;
+    friend class Utils;
     struct Implementation;
     std::unique_ptr<Implementation> implementation;
 };

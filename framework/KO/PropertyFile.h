@@ -7,7 +7,7 @@
 
 namespace KO {
 
-class PropertyFileAccess;
+class Utils;
 
 /**
  * A file of named string values. KO::Utils reads and writes its entries.
@@ -39,7 +39,7 @@ public:
     void close();
 
 private:
-    friend class PropertyFileAccess;
+    friend class Utils;
     struct Implementation;
     std::unique_ptr<Implementation> implementation;
 };

@@ -49,6 +49,13 @@ CMPIBroker handleOf(Broker& broker, const BrokerOptions& options) {
 
 }  // namespace
 
+const FunctionTables& standardTables() {
+    static const FunctionTables tables{
+        brokerTable,   encapsulationTable, threadTable,      memoryTable, stringTable,  objectPathTable, instanceTable,
+        dateTimeTable, arrayTable,         enumerationTable, argsTable,   contextTable, resultTable,     errorTable};
+    return tables;
+}
+
 Response notSupported(Operation operation) {
     return Response::failed(
         {CMPI_RC_ERR_NOT_SUPPORTED, std::string(nameOf(operation)) + " is not supported by this object manager."});
@@ -56,8 +63,6 @@ Response notSupported(Operation operation) {
 
 Broker::Broker(BrokerOptions itsOptions)
     : options(completed(std::move(itsOptions))), brokerHandle(handleOf(*this, options)), outside(tables()) {}
-
-Broker::~Broker() = default;
 
 Broker& Broker::of(const CMPIBroker* handle) {
     if (handle == nullptr || handle->hdl == nullptr) {
@@ -111,7 +116,7 @@ void Broker::leave(const Arena& arena) {
 
 CMPIContext* Broker::prepareThread(const ContextEntries& entries) {
     auto arena = std::make_unique<Arena>(tables(), &outside);
-    auto* context = arena->make<CMPIContext>({entries});
+    auto* context = arena->make<CMPIContext>(entries);
     const std::lock_guard<std::mutex> lock(mutex);
     threads.emplace(context, std::move(arena));
     return context;

@@ -59,7 +59,7 @@ struct BrokerOptions {
 class Broker {
 public:
     explicit Broker(BrokerOptions itsOptions = {});
-    ~Broker();
+    ~Broker() = default;
     Broker(const Broker&) = delete;
     Broker& operator=(const Broker&) = delete;
 

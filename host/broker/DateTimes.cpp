@@ -11,7 +11,6 @@ namespace cimhost {
 namespace {
 
 constexpr std::int64_t microsecondsInSecond = 1'000'000;
-constexpr std::size_t dateTimeLength = 25;
 
 int number(const std::string& dateTime, std::size_t position, std::size_t length) {
     return std::stoi(dateTime.substr(position, length));
@@ -36,11 +35,11 @@ std::int64_t secondsOfTime(const std::string& dateTime) {
 }  // namespace
 
 bool isIntervalForm(const std::string& dateTime) {
-    return dateTime.size() == dateTimeLength && dateTime[21] == ':';
+    return dateTime.size() == cim::noDate.size() && dateTime[21] == ':';
 }
 
 std::optional<std::int64_t> microsecondsOf(const std::string& dateTime) {
-    if (dateTime.size() != dateTimeLength || dateTime.find('*') != std::string::npos) {
+    if (dateTime.size() != cim::noDate.size() || dateTime.find('*') != std::string::npos) {
         return std::nullopt;
     }
     const std::int64_t seconds = isIntervalForm(dateTime) ? secondsOfInterval(dateTime) : secondsOfTime(dateTime);

@@ -5,9 +5,7 @@
 #include "broker/DateTimes.h"
 #include "broker/ErrorTranslation.h"
 #include "broker/FunctionTables.h"
-#include "broker/Messages.h"
 #include "broker/NamedValues.h"
-#include "broker/ObjectDescription.h"
 #include "cim/DateTime.h"
 
 // CMPIBrokerEncFT: creates encapsulated objects; logging, messages and types.
@@ -174,10 +172,6 @@ CMPIStatus logMessage(const CMPIBroker* broker, int severity, const char* id, co
 CMPIStatus trace(const CMPIBroker* broker, int level, const char* component, const char* characters,
                  const CMPIString* string) {
     return record(broker, {true, level, {}, {}}, component, characters, string);
-}
-
-std::optional<std::string> optionalString(const char* characters) {
-    return characters == nullptr ? std::nullopt : std::optional<std::string>(characters);
 }
 
 CMPIError* newCMPIError(const CMPIBroker* broker, const char* owner, const char* id, const char* message,

@@ -26,8 +26,7 @@ CMPIString* getString(const CMPIError* error, CMPIStatus* rc) {
 
 template <std::optional<std::string> ErrorInfo::*member>
 CMPIStatus setString(CMPIError* error, const char* value) {
-    return guarded(
-        [&] { content(error).*member = value == nullptr ? std::nullopt : std::optional<std::string>(value); });
+    return guarded([&] { content(error).*member = optionalString(value); });
 }
 
 using Strings = std::optional<std::vector<std::string>>;

@@ -4,6 +4,7 @@
 #include <cxxabi.h>
 
 #include <exception>
+#include <optional>
 #include <string>
 #include <utility>
 
@@ -92,5 +93,10 @@ typename Traits<Handle>::Content& argument(const Handle* handle) {
 
 /** The string of an argument. @throws Failure with CMPI_RC_ERR_INVALID_PARAMETER if it is null */
 std::string argument(const char* characters);
+
+/** The string of an optional argument; none if it is null. */
+inline std::optional<std::string> optionalString(const char* characters) {
+    return characters == nullptr ? std::nullopt : std::optional<std::string>(characters);
+}
 
 }  // namespace cimhost

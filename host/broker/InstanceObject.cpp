@@ -9,15 +9,9 @@
 namespace cimhost {
 namespace {
 
-const PropertyInfo* findProperty(const ClassInfo& classInfo, const std::string& name) {
-    const auto found = std::find_if(classInfo.properties.begin(), classInfo.properties.end(),
-                                    [&](const PropertyInfo& each) { return cim::sameName(each.name, name); });
-    return found == classInfo.properties.end() ? nullptr : &*found;
-}
-
 bool isKey(const InstanceContent& instance, const std::string& name) {
-    const PropertyInfo* classInfo = instance.classInfo ? findProperty(*instance.classInfo, name) : nullptr;
-    return classInfo != nullptr ? classInfo->isKey : findNamed(instance.value.path.keys, name) != nullptr;
+    const PropertyInfo* property = instance.classInfo ? findNamed(instance.classInfo->properties, name) : nullptr;
+    return property != nullptr ? property->isKey : findNamed(instance.value.path.keys, name) != nullptr;
 }
 
 /** Whether the property filter accepts a property. It usually accepts keys, which identify the instance. */
@@ -32,7 +26,7 @@ void checkAgainstClass(const ClassInfo* classInfo, const std::string& name, cons
     if (classInfo == nullptr) {
         return;
     }
-    const PropertyInfo* property = findProperty(*classInfo, name);
+    const PropertyInfo* property = findNamed(classInfo->properties, name);
     if (property == nullptr) {
         throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY, classInfo->name + " has no property " + name + ".");
     }

@@ -1,10 +1,9 @@
-#include "broker/Messages.h"
-
 #include <string>
 #include <vector>
 
 #include "broker/Broker.h"
 #include "broker/ErrorTranslation.h"
+#include "broker/FunctionTables.h"
 
 namespace cimhost {
 namespace {

@@ -1,26 +1,17 @@
 #include "broker/NamedValues.h"
 
-#include <algorithm>
+#include <utility>
 
 #include "broker/Convert.h"
 #include "broker/ErrorTranslation.h"
-#include "cim/Names.h"
 
 namespace cimhost {
 
-const NamedValue* findNamed(const std::vector<NamedValue>& values, std::string_view name) {
-    const auto found = std::find_if(values.begin(), values.end(),
-                                    [&](const NamedValue& each) { return cim::sameName(each.name, name); });
-    return found == values.end() ? nullptr : &*found;
-}
-
 void setNamed(std::vector<NamedValue>& values, std::string_view name, Value value) {
-    const auto found = std::find_if(values.begin(), values.end(),
-                                    [&](const NamedValue& each) { return cim::sameName(each.name, name); });
-    if (found == values.end()) {
-        values.push_back({std::string(name), std::move(value)});
-    } else {
+    if (NamedValue* found = findNamed(values, name)) {
         found->value = std::move(value);
+    } else {
+        values.push_back({std::string(name), std::move(value)});
     }
 }
 

@@ -6,14 +6,14 @@
 #include <vector>
 
 #include "broker/Arena.h"
+#include "cim/Names.h"
 #include "model/Value.h"
 
 // Lists of named values: keys, properties, arguments, context entries. Names are case-insensitive.
 
 namespace cimhost {
 
-/** The value of this name; null if there is none. */
-const NamedValue* findNamed(const std::vector<NamedValue>& values, std::string_view name);
+using cim::findNamed;
 
 /** Replaces the value of this name, or appends one. */
 void setNamed(std::vector<NamedValue>& values, std::string_view name, Value value);

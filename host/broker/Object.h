@@ -2,6 +2,7 @@
 
 #include <memory>
 #include <optional>
+#include <string>
 #include <utility>
 
 #include "broker/ObjectContents.h"
@@ -78,5 +79,11 @@ Encapsulated<Handle>* objectOf(const Handle* handle) {
     auto* object = static_cast<Object*>(handle->hdl);
     return object->kind() == Traits<Handle>::kind ? static_cast<Encapsulated<Handle>*>(object) : nullptr;
 }
+
+/** Name of the type of these objects, such as "CMPIInstance". */
+const char* typeNameOf(ObjectKind kind);
+
+/** Describes an object for people; "CMPIInstance (released)" after its release. */
+std::string describe(const Object& object);
 
 }  // namespace cimhost

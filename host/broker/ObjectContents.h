@@ -34,21 +34,9 @@ struct ArrayContent {
     std::vector<Scalar> elements{};
 };
 
-/** Content of a CMPIEnumeration: elements of one type, and the number of those that getNext returned. */
-struct EnumerationContent {
-    CMPIType type = CMPI_null;
-    std::vector<Scalar> elements{};
+/** Content of a CMPIEnumeration: the elements, and the number of those that getNext returned. */
+struct EnumerationContent : ArrayContent {
     std::size_t position = 0;
-};
-
-/** Content of a CMPIArgs. */
-struct ArgsContent {
-    std::vector<NamedValue> values{};
-};
-
-/** Content of a CMPIContext. */
-struct ContextContent {
-    std::vector<NamedValue> entries{};
 };
 
 /** Calls that a result rejects with an error. They do not become events. */
@@ -83,8 +71,8 @@ template <> struct Traits<CMPIInstance> : TraitsOf<InstanceContent, ObjectKind::
 template <> struct Traits<CMPIDateTime> : TraitsOf<DateTime, ObjectKind::dateTime, &FunctionTables::dateTime> {};
 template <> struct Traits<CMPIArray> : TraitsOf<ArrayContent, ObjectKind::array, &FunctionTables::array> {};
 template <> struct Traits<CMPIEnumeration> : TraitsOf<EnumerationContent, ObjectKind::enumeration, &FunctionTables::enumeration> {};
-template <> struct Traits<CMPIArgs> : TraitsOf<ArgsContent, ObjectKind::args, &FunctionTables::args> {};
-template <> struct Traits<CMPIContext> : TraitsOf<ContextContent, ObjectKind::context, &FunctionTables::context> {};
+template <> struct Traits<CMPIArgs> : TraitsOf<std::vector<NamedValue>, ObjectKind::args, &FunctionTables::args> {};
+template <> struct Traits<CMPIContext> : TraitsOf<ContextEntries, ObjectKind::context, &FunctionTables::context> {};
 template <> struct Traits<CMPIResult> : TraitsOf<ResultContent, ObjectKind::result, &FunctionTables::result> {};
 template <> struct Traits<CMPIError> : TraitsOf<ErrorInfo, ObjectKind::error, &FunctionTables::error> {};
 // clang-format on

@@ -1,6 +1,4 @@
-#include "broker/ObjectDescription.h"
-
-#include "broker/ErrorTranslation.h"
+#include "broker/Object.h"
 #include "schema/MofWriter.h"
 #include "schema/ObjectPathText.h"
 
@@ -15,11 +13,7 @@ std::string describe(const std::vector<NamedValue>& values) {
     return all;
 }
 
-std::string describe(CMPIType type, const std::vector<Scalar>& elements) {
-    return formatMof(Value::array(type, elements));
-}
-
-// One function per content.
+// One function per content; an enumeration is described as an array.
 
 std::string describe(const std::string& string) {
     return string;
@@ -38,19 +32,7 @@ std::string describe(const DateTime& time) {
 }
 
 std::string describe(const ArrayContent& array) {
-    return describe(array.type, array.elements);
-}
-
-std::string describe(const EnumerationContent& enumeration) {
-    return describe(enumeration.type, enumeration.elements);
-}
-
-std::string describe(const ArgsContent& args) {
-    return describe(args.values);
-}
-
-std::string describe(const ContextContent& context) {
-    return describe(context.entries);
+    return formatMof(Value::array(array.type, array.elements));
 }
 
 std::string describe(const ResultContent& result) {

@@ -35,13 +35,18 @@ CMPIStatus addKey(CMPIObjectPath* path, const char* name, const CMPIValue* value
     });
 }
 
-CMPIData asKey(CMPIData data) {
-    data.state = static_cast<CMPIValueState>(data.state | CMPI_keyValue);
-    return data;
-}
-
-/** Sets the status of a null key, which some object managers pass to providers. */
-CMPIData withNullStatus(const CMPIData& data, CMPIStatus* rc) {
+/**
+ * Returns what `read` finds among the keys, in the state of a key. The status of a null key, which some object managers
+ * pass to providers, is CMPI_RC_ERR_NOT_FOUND.
+ */
+template <class Read>
+CMPIData keyData(const CMPIObjectPath* path, CMPIStatus* rc, Read read) {
+    const CMPIData data = guarded(rc, badData(), [&] {
+        const auto& object = self(path);
+        CMPIData found = read(object.content->keys, arenaFor(object));
+        found.state = static_cast<CMPIValueState>(found.state | CMPI_keyValue);
+        return found;
+    });
     if (rc != nullptr && rc->rc == CMPI_RC_OK && (data.state & CMPI_nullValue) != 0) {
         rc->rc = CMPI_RC_ERR_NOT_FOUND;
     }
@@ -49,63 +54,42 @@ CMPIData withNullStatus(const CMPIData& data, CMPIStatus* rc) {
 }
 
 CMPIData getKey(const CMPIObjectPath* path, const char* name, CMPIStatus* rc) {
-    const CMPIData data = guarded(rc, badData(), [&] {
-        const auto& object = self(path);
-        return asKey(namedData(object.content->keys, name, arenaFor(object)));
-    });
-    return withNullStatus(data, rc);
+    return keyData(path, rc, [&](const auto& keys, Arena& arena) { return namedData(keys, name, arena); });
 }
 
 CMPIData getKeyAt(const CMPIObjectPath* path, CMPICount index, CMPIString** name, CMPIStatus* rc) {
-    const CMPIData data = guarded(rc, badData(), [&] {
-        const auto& object = self(path);
-        return asKey(namedDataAt(object.content->keys, index, name, arenaFor(object)));
-    });
-    return withNullStatus(data, rc);
+    return keyData(path, rc, [&](const auto& keys, Arena& arena) { return namedDataAt(keys, index, name, arena); });
 }
 
 CMPICount getKeyCount(const CMPIObjectPath* path, CMPIStatus* rc) {
     return guarded<CMPICount>(rc, 0, [&] { return static_cast<CMPICount>(content(path).keys.size()); });
 }
 
+/** Copies the namespace and the class of a path. @return the content of the target */
+ObjectPath& copyClass(CMPIObjectPath* path, const CMPIObjectPath* source) {
+    ObjectPath& target = content(path);
+    const ObjectPath& from = argument(source);
+    target.nameSpace = from.nameSpace;
+    target.className = from.className;
+    return target;
+}
+
 CMPIStatus setNameSpaceFromObjectPath(CMPIObjectPath* path, const CMPIObjectPath* source) {
-    return guarded([&] {
-        ObjectPath& target = content(path);
-        const ObjectPath& from = argument(source);
-        target.nameSpace = from.nameSpace;
-        target.className = from.className;
-    });
+    return guarded([&] { copyClass(path, source); });
 }
 
 CMPIStatus setHostAndNameSpaceFromObjectPath(CMPIObjectPath* path, const CMPIObjectPath* source) {
-    return guarded([&] {
-        ObjectPath& target = content(path);
-        const ObjectPath& from = argument(source);
-        target.host = from.host;
-        target.nameSpace = from.nameSpace;
-        target.className = from.className;
-    });
+    return guarded([&] { copyClass(path, source).host = argument(source).host; });
 }
 
 // Qualifiers are not supported, as the broker's capabilities state.
 
-CMPIData noQualifier(const CMPIObjectPath* path, CMPIStatus* rc) {
+template <class... Names>
+CMPIData noQualifier(const CMPIObjectPath* path, Names..., CMPIStatus* rc) {
     return guarded(rc, badData(), [&]() -> CMPIData {
         self(path);
         throw Failure(CMPI_RC_ERR_NOT_SUPPORTED);
     });
-}
-
-CMPIData getClassQualifier(const CMPIObjectPath* path, const char*, CMPIStatus* rc) {
-    return noQualifier(path, rc);
-}
-
-CMPIData getPropertyOrMethodQualifier(const CMPIObjectPath* path, const char*, const char*, CMPIStatus* rc) {
-    return noQualifier(path, rc);
-}
-
-CMPIData getParameterQualifier(const CMPIObjectPath* path, const char*, const char*, const char*, CMPIStatus* rc) {
-    return noQualifier(path, rc);
 }
 
 CMPIString* toString(const CMPIObjectPath* path, CMPIStatus* rc) {
@@ -132,10 +116,10 @@ const CMPIObjectPathFT objectPathTable{tableVersion,
                                        getKeyCount,
                                        setNameSpaceFromObjectPath,
                                        setHostAndNameSpaceFromObjectPath,
-                                       getClassQualifier,
-                                       getPropertyOrMethodQualifier,
-                                       getPropertyOrMethodQualifier,
-                                       getParameterQualifier,
+                                       noQualifier<const char*>,
+                                       noQualifier<const char*, const char*>,
+                                       noQualifier<const char*, const char*>,
+                                       noQualifier<const char*, const char*, const char*>,
                                        toString};
 
 }  // namespace cimhost

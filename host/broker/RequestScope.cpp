@@ -15,7 +15,7 @@ RequestScope::~RequestScope() {
 }
 
 CMPIContext* RequestScope::context(const ContextEntries& entries) {
-    return objects.make<CMPIContext>({entries});
+    return objects.make<CMPIContext>(entries);
 }
 
 CMPIObjectPath* RequestScope::objectPath(const ObjectPath& path) {

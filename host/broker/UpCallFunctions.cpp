@@ -11,11 +11,7 @@ namespace {
 /** The entries of the caller's context; none if it is null. */
 const ContextEntries& entriesOf(const CMPIContext* context) {
     static const ContextEntries none;
-    return context == nullptr ? none : argument(context).entries;
-}
-
-std::optional<std::string> optionalName(const char* name) {
-    return name == nullptr ? std::nullopt : std::optional<std::string>(name);
+    return context == nullptr ? none : argument(context);
 }
 
 /** Performs a request in the caller's context. @throws Failure with the status of the response if it is not OK */
@@ -30,7 +26,7 @@ Response performed(Broker& broker, const CMPIContext* context, Request request) 
 
 template <class Kind>
 CMPIEnumeration* enumerationOf(Broker& broker, CMPIType type, std::vector<Kind> values) {
-    EnumerationContent content{type, {}, 0};
+    EnumerationContent content{{type, {}}, 0};
     content.elements.reserve(values.size());
     for (Kind& value : values) {
         content.elements.emplace_back(std::make_shared<const Kind>(std::move(value)));
@@ -146,10 +142,10 @@ CMPIEnumeration* associators(const CMPIBroker* handle, const CMPIContext* contex
                              const char* associationClass, const char* resultClass, const char* role,
                              const char* resultRole, const char** properties, CMPIStatus* rc) {
     return enumerated(handle, context, rc, [&] {
-        return Request::associators(
-            argument(path),
-            {optionalName(associationClass), optionalName(resultClass), optionalName(role), optionalName(resultRole)},
-            propertyListFrom(properties));
+        return Request::associators(argument(path),
+                                    {optionalString(associationClass), optionalString(resultClass),
+                                     optionalString(role), optionalString(resultRole)},
+                                    propertyListFrom(properties));
     });
 }
 
@@ -157,15 +153,15 @@ CMPIEnumeration* associatorNames(const CMPIBroker* handle, const CMPIContext* co
                                  const char* associationClass, const char* resultClass, const char* role,
                                  const char* resultRole, CMPIStatus* rc) {
     return enumerated(handle, context, rc, [&] {
-        return Request::associatorNames(argument(path), {optionalName(associationClass), optionalName(resultClass),
-                                                         optionalName(role), optionalName(resultRole)});
+        return Request::associatorNames(argument(path), {optionalString(associationClass), optionalString(resultClass),
+                                                         optionalString(role), optionalString(resultRole)});
     });
 }
 
 CMPIEnumeration* references(const CMPIBroker* handle, const CMPIContext* context, const CMPIObjectPath* path,
                             const char* resultClass, const char* role, const char** properties, CMPIStatus* rc) {
     return enumerated(handle, context, rc, [&] {
-        return Request::references(argument(path), {{}, optionalName(resultClass), optionalName(role), {}},
+        return Request::references(argument(path), {{}, optionalString(resultClass), optionalString(role), {}},
                                    propertyListFrom(properties));
     });
 }
@@ -173,7 +169,7 @@ CMPIEnumeration* references(const CMPIBroker* handle, const CMPIContext* context
 CMPIEnumeration* referenceNames(const CMPIBroker* handle, const CMPIContext* context, const CMPIObjectPath* path,
                                 const char* resultClass, const char* role, CMPIStatus* rc) {
     return enumerated(handle, context, rc, [&] {
-        return Request::referenceNames(argument(path), {{}, optionalName(resultClass), optionalName(role), {}});
+        return Request::referenceNames(argument(path), {{}, optionalString(resultClass), optionalString(role), {}});
     });
 }
 
@@ -182,11 +178,11 @@ CMPIData invokeMethod(const CMPIBroker* handle, const CMPIContext* context, cons
     return guarded(rc, badData(), [&] {
         Broker& broker = Broker::of(handle);
         static const std::vector<NamedValue> none;
-        const auto& parameters = input == nullptr ? none : argument(input).values;
+        const auto& parameters = input == nullptr ? none : argument(input);
         Response response =
             performed(broker, context, Request::invokeMethod(argument(path), argument(method), parameters));
         if (output != nullptr) {
-            argument(output).values = std::move(response.output);
+            argument(output) = std::move(response.output);
         }
         return dataFrom(response.value, broker.arena());
     });

@@ -107,60 +107,36 @@ CMPIArray* toArray(const CMPIEnumeration* enumeration, CMPIStatus* rc) {
     });
 }
 
-// CMPIArgs.
+// CMPIArgs and CMPIContext, whose content is a list of named values.
 
-CMPIStatus addArg(const CMPIArgs* args, const char* name, const CMPIValue* value, const CMPIType type) {
+template <class Handle>
+CMPIStatus addValue(const Handle* handle, const char* name, const CMPIValue* value, const CMPIType type) {
     return guarded([&] {
-        ArgsContent& target = content(args);
-        const std::string argumentName = argument(name);
-        setNamed(target.values, argumentName, valueFrom(value, type));
+        std::vector<NamedValue>& values = content(handle);
+        const std::string valueName = argument(name);
+        setNamed(values, valueName, valueFrom(value, type));
     });
 }
 
-CMPIData getArg(const CMPIArgs* args, const char* name, CMPIStatus* rc) {
+template <class Handle>
+CMPIData getValue(const Handle* handle, const char* name, CMPIStatus* rc) {
     return guarded(rc, badData(), [&] {
-        const auto& object = self(args);
-        return namedData(object.content->values, name, arenaFor(object));
+        const auto& object = self(handle);
+        return namedData(*object.content, name, arenaFor(object));
     });
 }
 
-CMPIData getArgAt(const CMPIArgs* args, CMPICount index, CMPIString** name, CMPIStatus* rc) {
+template <class Handle>
+CMPIData getValueAt(const Handle* handle, CMPICount index, CMPIString** name, CMPIStatus* rc) {
     return guarded(rc, badData(), [&] {
-        const auto& object = self(args);
-        return namedDataAt(object.content->values, index, name, arenaFor(object));
+        const auto& object = self(handle);
+        return namedDataAt(*object.content, index, name, arenaFor(object));
     });
 }
 
-CMPICount getArgCount(const CMPIArgs* args, CMPIStatus* rc) {
-    return guarded<CMPICount>(rc, 0, [&] { return static_cast<CMPICount>(content(args).values.size()); });
-}
-
-// CMPIContext.
-
-CMPIData getEntry(const CMPIContext* context, const char* name, CMPIStatus* rc) {
-    return guarded(rc, badData(), [&] {
-        const auto& object = self(context);
-        return namedData(object.content->entries, name, arenaFor(object));
-    });
-}
-
-CMPIData getEntryAt(const CMPIContext* context, CMPICount index, CMPIString** name, CMPIStatus* rc) {
-    return guarded(rc, badData(), [&] {
-        const auto& object = self(context);
-        return namedDataAt(object.content->entries, index, name, arenaFor(object));
-    });
-}
-
-CMPICount getEntryCount(const CMPIContext* context, CMPIStatus* rc) {
-    return guarded<CMPICount>(rc, 0, [&] { return static_cast<CMPICount>(content(context).entries.size()); });
-}
-
-CMPIStatus addEntry(const CMPIContext* context, const char* name, const CMPIValue* value, const CMPIType type) {
-    return guarded([&] {
-        ContextContent& target = content(context);
-        const std::string entryName = argument(name);
-        setNamed(target.entries, entryName, valueFrom(value, type));
-    });
+template <class Handle>
+CMPICount getValueCount(const Handle* handle, CMPIStatus* rc) {
+    return guarded<CMPICount>(rc, 0, [&] { return static_cast<CMPICount>(content(handle).size()); });
 }
 
 }  // namespace
@@ -177,10 +153,11 @@ const CMPIArrayFT arrayTable{
 const CMPIEnumerationFT enumerationTable{
     tableVersion, releaseObject<CMPIEnumeration>, cloneObject<CMPIEnumeration>, getNext, hasNext, toArray};
 
-const CMPIArgsFT argsTable{tableVersion, releaseObject<CMPIArgs>, cloneObject<CMPIArgs>, addArg, getArg, getArgAt,
-                           getArgCount};
+const CMPIArgsFT argsTable{tableVersion,       releaseObject<CMPIArgs>, cloneObject<CMPIArgs>,  addValue<CMPIArgs>,
+                           getValue<CMPIArgs>, getValueAt<CMPIArgs>,    getValueCount<CMPIArgs>};
 
-const CMPIContextFT contextTable{
-    tableVersion, releaseObject<CMPIContext>, cloneObject<CMPIContext>, getEntry, getEntryAt, getEntryCount, addEntry};
+const CMPIContextFT contextTable{tableVersion,          releaseObject<CMPIContext>, cloneObject<CMPIContext>,
+                                 getValue<CMPIContext>, getValueAt<CMPIContext>,    getValueCount<CMPIContext>,
+                                 addValue<CMPIContext>};
 
 }  // namespace cimhost

@@ -5,7 +5,6 @@
 
 #include "Installation.h"
 #include "cli/Choice.h"
-#include "cli/ExitStatus.h"
 #include "cli/Suggestion.h"
 
 namespace cimhost {
@@ -81,17 +80,16 @@ constexpr Command commands[] = {
      "cimhost --schema my.mof classes"},
 };
 
+void addRepeatable(CLI::App& app, const char* option, std::vector<std::string>& values, const char* type,
+                   const std::string& description) {
+    app.add_option(option, values, description + " (repeatable)")->type_name(type)->allow_extra_args(false);
+}
+
 void addCommonOptions(CLI::App& app, Arguments& arguments) {
-    app.add_option("--schema", arguments.schemas, "MOF file with classes, or a directory of them (repeatable)")
-        ->type_name("FILE")
-        ->allow_extra_args(false);
-    app.add_option("--registration", arguments.registrations,
-                   "Provider registration file, or a directory of them (repeatable)")
-        ->type_name("FILE")
-        ->allow_extra_args(false);
-    app.add_option("--library-path", arguments.libraryPaths, "Directory with provider libraries (repeatable)")
-        ->type_name("DIR")
-        ->allow_extra_args(false);
+    addRepeatable(app, "--schema", arguments.schemas, "FILE", "MOF file with classes, or a directory of them");
+    addRepeatable(app, "--registration", arguments.registrations, "FILE",
+                  "Provider registration file, or a directory of them");
+    addRepeatable(app, "--library-path", arguments.libraryPaths, "DIR", "Directory with provider libraries");
     app.add_option("--namespace", arguments.nameSpace, "Namespace of paths without one")
         ->type_name("NAME")
         ->capture_default_str();
@@ -121,9 +119,7 @@ void addCommand(CLI::App& app, const Command& command, Arguments& arguments) {
     }
     if ((command.options & assigns) != 0) {
         sub->add_option("NAME=VALUE", arguments.assignments, "Value of a property; NAME= is the empty string");
-        sub->add_option("--null", arguments.nulls, "Set this property to null (repeatable)")
-            ->type_name("NAME")
-            ->allow_extra_args(false);
+        addRepeatable(*sub, "--null", arguments.nulls, "NAME", "Set this property to null");
     }
     if ((command.options & associates) != 0) {
         sub->add_option("--assoc-class", arguments.filter.associationClass, "Association to follow")

@@ -3,7 +3,6 @@
 #include <algorithm>
 
 #include "cim/Names.h"
-#include "cli/ExitStatus.h"
 #include "cli/Output.h"
 #include "cli/RequestBuilder.h"
 #include "cli/SearchPaths.h"
@@ -138,10 +137,9 @@ std::vector<ListedClass> listClasses(const Schema& schema, const std::vector<Pro
         list.push_back({each->name, each});
     }
     for (const ProviderRegistration& registration : registrations) {
-        const auto same = [&](const ListedClass& each) { return cim::sameName(each.name, registration.className); };
-        auto listed = std::find_if(list.begin(), list.end(), same);
-        if (listed == list.end()) {
-            listed = list.insert(list.end(), {registration.className});
+        ListedClass* listed = cim::findNamed(list, registration.className);
+        if (listed == nullptr) {
+            listed = &list.emplace_back(ListedClass{registration.className});
         }
         listed->providers.push_back(registration);
     }

@@ -4,7 +4,6 @@
 
 #include "cim/Utf8.h"
 #include "operations/StatusText.h"
-#include "schema/CimType.h"
 #include "schema/ObjectPathText.h"
 
 namespace cimhost::json {

@@ -8,7 +8,6 @@
 #include <cstring>
 #include <string>
 
-#include "cli/ExitStatus.h"
 #include "operations/StatusText.h"
 #include "schema/Errors.h"
 

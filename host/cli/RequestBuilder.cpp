@@ -1,9 +1,6 @@
 #include "cli/RequestBuilder.h"
 
-#include <algorithm>
-
 #include "broker/NamedValues.h"
-#include "cli/ExitStatus.h"
 #include "cli/Suggestion.h"
 #include "cli/TextLayout.h"
 #include "schema/Literal.h"
@@ -28,15 +25,21 @@ const Class& classOf(const ObjectPath& path, const Schema& schema) {
     return *known;
 }
 
+template <class Elements>
+std::vector<std::string> namesOf(const Elements& elements) {
+    std::vector<std::string> names;
+    for (const auto& each : elements) {
+        names.push_back(each.name);
+    }
+    return names;
+}
+
 const Property& propertyOf(const Class& known, const std::string& name) {
     const Property* property = known.findProperty(name);
     if (property != nullptr) {
         return *property;
     }
-    std::vector<std::string> names;
-    for (const Property& each : known.properties) {
-        names.push_back(each.name);
-    }
+    const std::vector<std::string> names = namesOf(known.properties);
     throw UsageError("class " + known.name + " has no property " + name + "; its properties are " +
                      joined(names, ", ") + didYouMean(name, names));
 }
@@ -90,9 +93,9 @@ std::vector<NamedValue> readValues(const Arguments& arguments, const ObjectPath&
     return std::move(reader.values);
 }
 
-/** Copies each key from the path to the properties, before the others, or from the properties to the path. */
+/** Copies the keys among the properties to the path. The object manager adds those of the path to the properties. */
 void joinKeys(Request& request, const Schema& schema) {
-    std::vector<NamedValue>& properties = request.instance.properties;
+    const std::vector<NamedValue>& properties = request.instance.properties;
     const Class* known = schema.findClass(request.path.className);
     for (const Property* key : known != nullptr ? known->keys() : std::vector<const Property*>()) {
         const NamedValue* inPath = findNamed(request.path.keys, key->name);
@@ -107,20 +110,6 @@ void joinKeys(Request& request, const Schema& schema) {
             request.path.keys.push_back(*given);
         }
     }
-    std::vector<NamedValue> complete;
-    const auto isNew = [&](const NamedValue& key) { return findNamed(properties, key.name) == nullptr; };
-    std::copy_if(request.path.keys.begin(), request.path.keys.end(), std::back_inserter(complete), isNew);
-    complete.insert(complete.end(), properties.begin(), properties.end());
-    properties = std::move(complete);
-}
-
-std::vector<std::string> namesOf(const std::vector<NamedValue>& values) {
-    std::vector<std::string> names;
-    names.reserve(values.size());
-    for (const NamedValue& each : values) {
-        names.push_back(each.name);
-    }
-    return names;
 }
 
 void addInstance(Request& request, const Arguments& arguments, const Schema& schema) {

@@ -26,7 +26,7 @@ std::size_t distance(const std::string& one, const std::string& other) {
 
 }  // namespace
 
-std::string nearest(std::string_view word, const std::vector<std::string>& names) {
+std::string didYouMean(std::string_view word, const std::vector<std::string>& names) {
     std::string found;
     std::size_t least = std::max<std::size_t>(1, word.size() / 4) + 1;
     for (const std::string& name : names) {
@@ -36,12 +36,7 @@ std::string nearest(std::string_view word, const std::vector<std::string>& names
             found = name;
         }
     }
-    return found;
-}
-
-std::string didYouMean(std::string_view word, const std::vector<std::string>& names) {
-    const std::string name = nearest(word, names);
-    return name.empty() ? "" : "; did you mean " + name + "?";
+    return found.empty() ? "" : "; did you mean " + found + "?";
 }
 
 }  // namespace cimhost

@@ -1,6 +1,5 @@
 #include "cli/Output.h"
 #include "operations/StatusText.h"
-#include "schema/CimType.h"
 #include "schema/MofWriter.h"
 #include "schema/ObjectPathText.h"
 

@@ -32,26 +32,11 @@ struct Response {
     std::vector<NamedValue> output{};           ///< output parameters of invokeMethod
     std::vector<ProviderResponse> providers{};  ///< one per provider that was called
 
-    static Response failed(Status status) {
-        Response response;
-        response.status = std::move(status);
-        return response;
-    }
-    static Response ofInstances(std::vector<Instance> instances) {
-        Response response;
-        response.instances = std::move(instances);
-        return response;
-    }
-    static Response ofPaths(std::vector<ObjectPath> paths) {
-        Response response;
-        response.paths = std::move(paths);
-        return response;
-    }
+    static Response failed(Status status) { return {std::move(status)}; }
+    static Response ofInstances(std::vector<Instance> instances) { return {{}, std::move(instances)}; }
+    static Response ofPaths(std::vector<ObjectPath> paths) { return {{}, {}, std::move(paths)}; }
     static Response ofValue(Value value, std::vector<NamedValue> output = {}) {
-        Response response;
-        response.value = std::move(value);
-        response.output = std::move(output);
-        return response;
+        return {{}, {}, {}, std::move(value), std::move(output)};
     }
 
     bool ok() const { return status.ok(); }

@@ -1,7 +1,10 @@
 #include "model/Value.h"
 
+#include <algorithm>
 #include <iterator>
 #include <utility>
+
+#include "cim/Names.h"
 
 namespace cimhost {
 namespace {
@@ -12,10 +15,47 @@ constexpr CMPIType types[] = {CMPI_null,   CMPI_boolean, CMPI_char16,   CMPI_uin
                               CMPI_real64, CMPI_string,  CMPI_dateTime, CMPI_ref,    CMPI_instance};
 static_assert(std::size(types) == std::variant_size_v<Scalar>);
 
+struct TypeRow {
+    CMPIType type;
+    std::string_view name;
+    bool intrinsic;
+};
+
+constexpr TypeRow typeRows[] = {
+    {CMPI_boolean, "boolean", true},    {CMPI_char16, "char16", true},     {CMPI_uint8, "uint8", true},
+    {CMPI_uint16, "uint16", true},      {CMPI_uint32, "uint32", true},     {CMPI_uint64, "uint64", true},
+    {CMPI_sint8, "sint8", true},        {CMPI_sint16, "sint16", true},     {CMPI_sint32, "sint32", true},
+    {CMPI_sint64, "sint64", true},      {CMPI_real32, "real32", true},     {CMPI_real64, "real64", true},
+    {CMPI_string, "string", true},      {CMPI_dateTime, "datetime", true}, {CMPI_ref, "reference", false},
+    {CMPI_instance, "instance", false}, {CMPI_chars, "string", false},     {CMPI_null, "null", false},
+};
+
+template <typename Predicate>
+const TypeRow* findType(Predicate matches) {
+    const auto* row = std::find_if(std::begin(typeRows), std::end(typeRows), matches);
+    return row == std::end(typeRows) ? nullptr : row;
+}
+
+const TypeRow* findType(CMPIType type) {
+    const int element = type & ~CMPI_ARRAY;
+    return findType([&](const TypeRow& row) { return row.type == element; });
+}
+
 }  // namespace
 
 CMPIType typeOf(const Scalar& scalar) {
     return types[scalar.index()];
+}
+
+std::string_view typeName(CMPIType type) {
+    const TypeRow* row = findType(type);
+    return row != nullptr ? row->name : "unknown";
+}
+
+std::optional<CMPIType> intrinsicType(std::string_view name) {
+    const TypeRow* row =
+        findType([&](const TypeRow& each) { return each.intrinsic && cim::sameName(each.name, name); });
+    return row != nullptr ? std::optional(row->type) : std::nullopt;
 }
 
 Value Value::of(Scalar scalar) {

@@ -5,7 +5,9 @@
 #include <cstddef>
 #include <cstdint>
 #include <memory>
+#include <optional>
 #include <string>
+#include <string_view>
 #include <variant>
 #include <vector>
 
@@ -34,6 +36,17 @@ using Scalar = std::variant<std::monostate, bool, Char16, std::uint8_t, std::uin
 
 /** The CIM type of a Scalar's alternative, such as CMPI_uint32 for std::uint32_t; CMPI_null for std::monostate. */
 CMPIType typeOf(const Scalar& scalar);
+
+/** Name of a CIM type in MOF, without array brackets; "reference" or "instance" for these. */
+std::string_view typeName(CMPIType type);
+
+/** The intrinsic type of this name in MOF, which ignores letter case; none for other names. */
+std::optional<CMPIType> intrinsicType(std::string_view name);
+
+/** Whether the type is one of the eight integer types, or an array of them. */
+inline bool isInteger(CMPIType type) {
+    return (type & CMPI_INTEGER) != 0 && (type & CMPI_ENC) == 0;
+}
 
 /** A CIM value, also null, with its declared type. */
 struct Value {

@@ -42,7 +42,7 @@ LoadedLibrary::LoadedLibrary(std::filesystem::path itsFile, int flags)
 }
 
 LoadedLibrary::~LoadedLibrary() {
-    if (!isKept) {
+    if (!staysLoaded) {
         dlclose(handle);
     }
 }

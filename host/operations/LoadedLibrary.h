@@ -58,14 +58,14 @@ public:
     const std::filesystem::path& file() const { return libraryFile; }
 
     /** Keeps the library in the process until it ends. */
-    void keep() { isKept = true; }
+    void keep() { staysLoaded = true; }
 
 private:
     void* symbol(const std::string& name) const;
 
     std::filesystem::path libraryFile;
     void* handle;
-    bool isKept = false;
+    bool staysLoaded = false;
 };
 
 }  // namespace cimhost

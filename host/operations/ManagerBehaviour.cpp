@@ -24,20 +24,6 @@ const ManagerBehaviour& ManagerBehaviour::standard() {
     return behaviour;
 }
 
-Status ManagerBehaviour::coerceTypes(Request&, const Broker&) const {
-    return {};
-}
-
-void ManagerBehaviour::adapt(Request&, const Broker&) const {}
-
-ResultRules ManagerBehaviour::resultRules(Operation) const {
-    return {};
-}
-
-std::string ManagerBehaviour::crashReason(const ProviderResponse&, Operation) const {
-    return {};
-}
-
 Status ManagerBehaviour::statusOf(const ProviderResponse& response, Operation operation) const {
     return response.status.ok() ? Status{} : Status{response.status.rc, messageOf(response, operation)};
 }

@@ -67,12 +67,12 @@ public:
 
     /** Checks the types of the properties that a client sent, and may convert them. @return not OK: reject the request
      */
-    virtual Status coerceTypes(Request& request, const Broker& broker) const;
+    virtual Status coerceTypes(Request& /*request*/, const Broker& /*broker*/) const { return {}; }
 
     /** Changes a request into the form that the manager passes to providers. */
-    virtual void adapt(Request& request, const Broker& broker) const;
+    virtual void adapt(Request& /*request*/, const Broker& /*broker*/) const {}
 
-    virtual ResultRules resultRules(Operation operation) const;
+    virtual ResultRules resultRules(Operation /*operation*/) const { return {}; }
 
     /** Calls the provider on the thread that the manager uses for the request, and waits until it returns. */
     virtual void onRequestThread(const std::function<void()>& callProvider) const { callProvider(); }
@@ -81,7 +81,7 @@ public:
     /** @name Responses */
     ///@{
     /** Why the response would have crashed the provider's process, as a sentence; empty: it would not. */
-    virtual std::string crashReason(const ProviderResponse& response, Operation operation) const;
+    virtual std::string crashReason(const ProviderResponse& /*response*/, Operation /*operation*/) const { return {}; }
 
     /** The status that the client receives for a provider's response: OK, or a code with a message. */
     virtual Status statusOf(const ProviderResponse& response, Operation operation) const;

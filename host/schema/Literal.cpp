@@ -5,8 +5,8 @@
 #include <limits>
 
 #include "cim/DateTime.h"
-#include "schema/CimType.h"
 #include "schema/Errors.h"
+#include "schema/ObjectPathText.h"
 
 namespace cimhost {
 namespace {
@@ -55,43 +55,53 @@ Scalar realScalar(const Literal& literal, CMPIType type) {
     return value;
 }
 
-const std::string& stringOf(const Literal& literal, CMPIType type, const std::string& remedy) {
-    const auto* string = std::get_if<std::string>(&literal.value);
-    if (string == nullptr) {
-        refuse(literal, type, remedy);
-    }
-    return *string;
-}
-
-Scalar booleanScalar(const Literal& literal, CMPIType type) {
-    const bool* value = std::get_if<bool>(&literal.value);
+/** The value of a literal of this kind. @throws ValueError with the remedy for other literals */
+template <typename Kind>
+const Kind& valueOf(const Literal& literal, CMPIType type, const std::string& remedy) {
+    const Kind* value = std::get_if<Kind>(&literal.value);
     if (value == nullptr) {
-        refuse(literal, type, "it must be true or false");
+        refuse(literal, type, remedy);
     }
     return *value;
 }
 
+Scalar booleanScalar(const Literal& literal, CMPIType type) {
+    return valueOf<bool>(literal, type, "it must be true or false");
+}
+
 Scalar characterScalar(const Literal& literal, CMPIType type) {
-    const auto* character = std::get_if<Char16>(&literal.value);
-    if (character == nullptr) {
-        refuse(literal, type, "it must be one character in apostrophes, such as 'a'");
-    }
-    return *character;
+    return valueOf<Char16>(literal, type, "it must be one character in apostrophes, such as 'a'");
 }
 
 Scalar stringScalar(const Literal& literal, CMPIType type) {
-    return stringOf(literal, type, "write it in quotation marks, \"" + literal.source + "\"");
+    return valueOf<std::string>(literal, type, "write it in quotation marks, \"" + literal.source + "\"");
 }
 
 Scalar dateTimeScalar(const Literal& literal, CMPIType type) {
     const std::string remedy =
         "it must be 25 characters, a time such as \"20260131120000.000000+060\" or an interval such as "
         "\"00000007000000.000000:000\"";
-    const std::string& string = stringOf(literal, type, remedy);
+    const auto& string = valueOf<std::string>(literal, type, remedy);
     if (!cim::isDateTime(string) && !cim::isNoDate(string)) {
         refuse(literal, type, remedy);
     }
     return DateTime{string};
+}
+
+Scalar reference(const Literal& literal, const Property& property, const Schema& schema,
+                 const std::string& defaultNameSpace) {
+    const auto* uri = std::get_if<std::string>(&literal.value);
+    if (uri == nullptr) {
+        throw ValueError(literal.source + " is not a reference: write the path of a " + property.referenceClass +
+                         " in quotation marks, such as \"" + property.referenceClass + ".Key=\\\"x\\\"\"");
+    }
+    auto path = std::make_shared<ObjectPath>(parseObjectPath(*uri, schema, defaultNameSpace));
+    const bool known = schema.findClass(path->className) != nullptr && schema.findClass(property.referenceClass);
+    if (known && !schema.isA(path->className, property.referenceClass)) {
+        throw ValueError(property.name + " must refer to a " + property.referenceClass + ", not to a " +
+                         path->className);
+    }
+    return std::shared_ptr<const ObjectPath>(std::move(path));
 }
 
 struct Converter {
@@ -137,6 +147,14 @@ Scalar typedScalar(const Literal& literal, CMPIType type) {
         }
     }
     refuse(literal, type, "a value of this type cannot be written as a constant");
+}
+
+Scalar typedElement(const Literal& literal, const Property& property, const Schema& schema,
+                    const std::string& defaultNameSpace) {
+    if (property.type == CMPI_ref && !std::holds_alternative<std::monostate>(literal.value)) {
+        return reference(literal, property, schema, defaultNameSpace);
+    }
+    return typedScalar(literal, property.type);
 }
 
 CMPIType literalType(const Literal& literal) {

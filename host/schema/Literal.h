@@ -5,6 +5,7 @@
 #include <variant>
 
 #include "model/Value.h"
+#include "schema/Schema.h"
 
 namespace cimhost {
 
@@ -26,6 +27,15 @@ struct Literal {
  * @throws ValueError if the literal is of another kind or out of range
  */
 Scalar typedScalar(const Literal& literal, CMPIType type);
+
+/**
+ * Converts a literal to an element of a property's value. The literal of a reference is a string with its path.
+ *
+ * @param defaultNameSpace of a reference without a namespace
+ * @throws ValueError, PathError if it does not match the property's type or the class of the reference
+ */
+Scalar typedElement(const Literal& literal, const Property& property, const Schema& schema,
+                    const std::string& defaultNameSpace);
 
 /** The type of a literal that no class declares: string, boolean, uint64 or (negative) sint64, real64, char16. */
 CMPIType literalType(const Literal& literal);

@@ -2,6 +2,9 @@
 
 #include <tao/pegtl.hpp>
 #include <tao/pegtl/contrib/parse_tree.hpp>
+#include <tao/pegtl/must_if.hpp>
+
+#include <vector>
 
 #include "schema/Literal.h"
 
@@ -11,6 +14,27 @@ namespace cimhost::grammar {
 namespace peg = tao::pegtl;
 
 using Node = peg::parse_tree::node;
+
+/** A rule, as the argument of the function that returns its message. */
+template <typename Rule>
+struct Tag {};
+
+/** The rules without a message. Base of the messages of a grammar, which overload the function for their rules. */
+struct NoMessages {
+    template <typename Rule>
+    static constexpr const char* of(Tag<Rule>) {
+        return nullptr;
+    }
+};
+
+/** The errors of a grammar. Messages::of(Tag<Rule>) returns the message if a required rule does not match. */
+template <typename Messages>
+struct Errors {
+    template <typename Rule>
+    static constexpr const char* message = Messages::of(Tag<Rule>{});
+    template <typename Rule>
+    static constexpr bool raise_on_failure = false;  // the rules are also used where they may fail
+};
 
 struct NameStart : peg::sor<peg::alpha, peg::one<'_'>> {};
 struct NameOther : peg::sor<peg::alnum, peg::one<'_'>> {};
@@ -56,5 +80,28 @@ using LiteralNodes =
 
 /** Converts one of the LiteralNodes. @throws ValueError if a character does not have 16 bits */
 Literal readLiteral(const Node& node);
+
+/** The first child of this rule, or null. */
+template <typename Rule>
+const Node* findChild(const Node& node) {
+    for (const auto& child : node.children) {
+        if (child->is_type<Rule>()) {
+            return child.get();
+        }
+    }
+    return nullptr;
+}
+
+/** All children of this rule. */
+template <typename Rule>
+std::vector<const Node*> children(const Node& node) {
+    std::vector<const Node*> found;
+    for (const auto& child : node.children) {
+        if (child->is_type<Rule>()) {
+            found.push_back(child.get());
+        }
+    }
+    return found;
+}
 
 }  // namespace cimhost::grammar

@@ -1,18 +1,18 @@
 #include "schema/MofBuilder.h"
 
-#include <algorithm>
 #include <stdexcept>
 
-#include "schema/CimType.h"
 #include "schema/Errors.h"
 #include "schema/MofGrammar.h"
-#include "schema/MofValues.h"
-#include "schema/TypedElement.h"
+#include "schema/StringLiteral.h"
 
 namespace cimhost {
 namespace {
 
 namespace mof = grammar::mof;
+using cim::findNamed;
+using grammar::children;
+using grammar::findChild;
 using grammar::Node;
 
 [[noreturn]] void fail(const Node& node, const std::string& message) {
@@ -57,11 +57,9 @@ void applyFlavor(Flavor& flavor, const Node& node) {
         {"EnableOverride", &Flavor::overridable, true}, {"DisableOverride", &Flavor::overridable, false},
         {"ToSubclass", &Flavor::toSubclass, true},      {"ToInstance", &Flavor::toSubclass, true},
         {"Restricted", &Flavor::toSubclass, false},     {"Translatable", &Flavor::translatable, true}};
-    for (const Row& row : rows) {
-        if (cim::sameName(row.name, node.string_view())) {
-            flavor.*row.member = row.value;
-            return;
-        }
+    if (const Row* row = findNamed(rows, node.string_view())) {
+        flavor.*row->member = row->value;
+        return;
     }
     fail(node, node.string() +
                    " is not a flavor: expected EnableOverride, DisableOverride, ToSubclass, Restricted or "
@@ -72,12 +70,6 @@ void applyFlavor(Flavor& flavor, const Node& node) {
 const Node* initializerOf(const Node& node) {
     const Node* array = findChild<mof::ArrayInitializer>(node);
     return array != nullptr ? array : findChild<mof::Constant>(node);
-}
-
-const NamedValue* findNamed(const std::vector<NamedValue>& values, std::string_view name) {
-    const auto found = std::find_if(values.begin(), values.end(),
-                                    [&](const NamedValue& each) { return cim::sameName(each.name, name); });
-    return found == values.end() ? nullptr : &*found;
 }
 
 /** Adds the default values of the class to an instance, and the keys to its path. */
@@ -96,11 +88,20 @@ void complete(Instance& instance, const Class& declared, const Node& node) {
     }
 }
 
-Value trueValue() {
-    return Value::of(CMPI_boolean, true);
-}
-
 }  // namespace
+
+Literal constantLiteral(const Node& constant) {
+    const std::vector<const Node*> parts = children<mof::StringPart>(constant);
+    if (!parts.empty()) {
+        std::string value;
+        for (const Node* part : parts) {
+            value += unescaped(part->string_view());
+        }
+        std::string source = inQuotes(value);
+        return {std::move(value), std::move(source)};
+    }
+    return grammar::readLiteral(*constant.children.front());
+}
 
 void MofBuilder::build(const Node& root) {
     for (const auto& child : root.children) {
@@ -194,8 +195,7 @@ std::vector<Qualifier> MofBuilder::readQualifiers(const Node* list) const {
     }
     for (const Node* node : children<mof::Qualifier>(*list)) {
         Qualifier qualifier = readQualifier(*node);
-        const auto same = [&](const Qualifier& each) { return cim::sameName(each.name, qualifier.name); };
-        if (std::any_of(qualifiers.begin(), qualifiers.end(), same)) {
+        if (findNamed(qualifiers, qualifier.name) != nullptr) {
             fail(*node, "qualifier " + qualifier.name + " is given twice");
         }
         qualifiers.push_back(std::move(qualifier));
@@ -214,7 +214,7 @@ Qualifier MofBuilder::readQualifier(const Node& node) const {
     if (const Node* initializer = initializerOf(node)) {
         qualifier.value = readValue(*initializer, {name, declaration->type, declaration->isArray});
     } else if (declaration->type == CMPI_boolean && !declaration->isArray) {
-        qualifier.value = trueValue();
+        qualifier.value = Value::of(CMPI_boolean, true);
     }
     for (const Node* flavor : children<mof::FlavorName>(node)) {
         applyFlavor(qualifier.flavor, *flavor);

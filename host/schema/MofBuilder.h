@@ -41,4 +41,7 @@ private:
     std::map<std::string, ObjectPath, cim::NameLess> aliases{};
 };
 
+/** The literal of a MOF constant. Adjacent strings are joined. An alias results in NULL. */
+Literal constantLiteral(const grammar::Node& constant);
+
 }  // namespace cimhost

@@ -1,117 +1,80 @@
 #pragma once
 
-#include <tao/pegtl/must_if.hpp>
-
 #include "schema/MofGrammar.h"
 
-/** Error messages of the MOF parser, by rule. */
 namespace cimhost::grammar::mof {
 
-/** The message if a required rule does not match. */
-template <typename Rule>
-inline constexpr const char* expected = nullptr;
-
-template <>
-inline constexpr auto expected<ClosedComment> = "this comment is not closed: expected */";
-template <>
-inline constexpr auto expected<CommentBody> = "this comment is not closed: expected */";
-template <>
-inline constexpr auto expected<StringPart> = "expected the characters of a string";
-template <>
-inline constexpr auto expected<StringEnd> =
-    "this string is wrong here: expected its closing quotation mark, or one of the escapes \\b \\t \\n \\f \\r \\\" "
-    "\\' \\\\ \\xHHHH";
-template <>
-inline constexpr auto expected<Constant> =
-    "expected a value: a string in quotation marks, a number, true, false, null, a character in apostrophes or an "
-    "alias";
-template <>
-inline constexpr auto expected<Initializer> = "expected a value or a list of values in braces";
-template <>
-inline constexpr auto expected<Flavors> = "expected a flavor such as DisableOverride";
-template <>
-inline constexpr auto expected<CommaList<Qualifier>> = "expected a qualifier's name";
-template <>
-inline constexpr auto expected<Qualifier> = "expected a qualifier's name";
-template <>
-inline constexpr auto expected<Parameter> = "expected a parameter: its type and its name";
-template <>
-inline constexpr auto expected<UnqualifiedFeature> = "expected a property, a reference or a method after qualifiers";
-template <>
-inline constexpr auto expected<Token<ParameterName>> = "expected the parameter's name";
-template <>
-inline constexpr auto expected<Token<FeatureName>> = "expected the name of a property, reference or method";
-template <>
-inline constexpr auto expected<Token<ClassName>> = "expected a class name";
-template <>
-inline constexpr auto expected<Token<SuperclassName>> = "expected the name of the superclass";
-template <>
-inline constexpr auto expected<Token<Alias>> = "expected an alias such as $Name";
-template <>
-inline constexpr auto expected<ClassBodyEnd> =
-    "expected a property, a reference, a method or the } that ends the class";
-template <>
-inline constexpr auto expected<Token<OfWord>> = "expected \"of\" after \"instance\"";
-template <>
-inline constexpr auto expected<InstanceBodyEnd> = "expected \"Name = value;\" or the } that ends the instance";
-template <>
-inline constexpr auto expected<Token<ScopeWord>> = "expected \"Scope\"";
-template <>
-inline constexpr auto expected<Token<FlavorWord>> = "expected \"Flavor\"";
-template <>
-inline constexpr auto expected<CommaList<Token<MetaElement>>> = "expected a scope such as property";
-template <>
-inline constexpr auto expected<Token<MetaElement>> = "expected a scope such as property";
-template <>
-inline constexpr auto expected<CommaList<Token<FlavorName>>> = "expected a flavor such as DisableOverride";
-template <>
-inline constexpr auto expected<Token<FlavorName>> = "expected a flavor such as DisableOverride";
-template <>
-inline constexpr auto expected<Token<QualifierName>> = "expected a qualifier's name";
-template <>
-inline constexpr auto expected<Token<DataType>> = "expected a data type";
-template <>
-inline constexpr auto expected<Token<PragmaWord>> = "expected \"pragma\" after #";
-template <>
-inline constexpr auto expected<Token<PragmaName>> = "expected the pragma's name, such as include";
-template <>
-inline constexpr auto expected<StringValue> = "expected a string in quotation marks";
-template <>
-inline constexpr auto expected<ClassOrInstance> = "expected \"class\" or \"instance of\" after qualifiers";
-template <>
-inline constexpr auto expected<FileEnd> =
-    "expected #pragma, \"qualifier\", \"class\", \"instance of\" or qualifiers in [ ]";
-template <>
-inline constexpr auto expected<ArrayInitializer> =
-    "expected a list of values in braces, such as {1, 2} or {\"a\", \"b\"}";
-template <>
-inline constexpr auto expected<LoneArrayEnd> = "expected nothing more after the closing brace";
-template <>
-inline constexpr auto expected<Mark<'{'>> = "expected {";
-template <>
-inline constexpr auto expected<Mark<'}'>> = "expected a comma or }";
-template <>
-inline constexpr auto expected<Mark<'('>> = "expected (";
-template <>
-inline constexpr auto expected<Mark<')'>> = "expected )";
-template <>
-inline constexpr auto expected<Mark<']'>> = "expected a comma or ]";
-template <>
-inline constexpr auto expected<Mark<':'>> = "expected :";
-template <>
-inline constexpr auto expected<Mark<','>> = "expected a comma";
-template <>
-inline constexpr auto expected<Mark<'='>> = "expected =";
-template <>
-inline constexpr auto expected<Mark<';'>> = "expected ;";
-
-struct Errors {
-    template <typename Rule>
-    static constexpr const char* message = expected<Rule>;
-    template <typename Rule>
-    static constexpr bool raise_on_failure = false;  // the rules are also used where they may fail
+/** Error messages of the MOF parser, by rule. */
+struct Messages : NoMessages {
+    using NoMessages::of;
+    static constexpr const char* of(Tag<ClosedComment>) { return "this comment is not closed: expected */"; }
+    static constexpr const char* of(Tag<CommentBody>) { return "this comment is not closed: expected */"; }
+    static constexpr const char* of(Tag<StringPart>) { return "expected the characters of a string"; }
+    static constexpr const char* of(Tag<StringEnd>) {
+        return "this string is wrong here: expected its closing quotation mark, or one of the escapes \\b \\t \\n \\f "
+               "\\r \\\" \\' \\\\ \\xHHHH";
+    }
+    static constexpr const char* of(Tag<Constant>) {
+        return "expected a value: a string in quotation marks, a number, true, false, null, a character in apostrophes "
+               "or an alias";
+    }
+    static constexpr const char* of(Tag<Initializer>) { return "expected a value or a list of values in braces"; }
+    static constexpr const char* of(Tag<Flavors>) { return "expected a flavor such as DisableOverride"; }
+    static constexpr const char* of(Tag<CommaList<Qualifier>>) { return "expected a qualifier's name"; }
+    static constexpr const char* of(Tag<Qualifier>) { return "expected a qualifier's name"; }
+    static constexpr const char* of(Tag<Parameter>) { return "expected a parameter: its type and its name"; }
+    static constexpr const char* of(Tag<UnqualifiedFeature>) {
+        return "expected a property, a reference or a method after qualifiers";
+    }
+    static constexpr const char* of(Tag<Token<ParameterName>>) { return "expected the parameter's name"; }
+    static constexpr const char* of(Tag<Token<FeatureName>>) {
+        return "expected the name of a property, reference or method";
+    }
+    static constexpr const char* of(Tag<Token<ClassName>>) { return "expected a class name"; }
+    static constexpr const char* of(Tag<Token<SuperclassName>>) { return "expected the name of the superclass"; }
+    static constexpr const char* of(Tag<Token<Alias>>) { return "expected an alias such as $Name"; }
+    static constexpr const char* of(Tag<ClassBodyEnd>) {
+        return "expected a property, a reference, a method or the } that ends the class";
+    }
+    static constexpr const char* of(Tag<Token<OfWord>>) { return "expected \"of\" after \"instance\""; }
+    static constexpr const char* of(Tag<InstanceBodyEnd>) {
+        return "expected \"Name = value;\" or the } that ends the instance";
+    }
+    static constexpr const char* of(Tag<Token<ScopeWord>>) { return "expected \"Scope\""; }
+    static constexpr const char* of(Tag<Token<FlavorWord>>) { return "expected \"Flavor\""; }
+    static constexpr const char* of(Tag<CommaList<Token<MetaElement>>>) { return "expected a scope such as property"; }
+    static constexpr const char* of(Tag<Token<MetaElement>>) { return "expected a scope such as property"; }
+    static constexpr const char* of(Tag<CommaList<Token<FlavorName>>>) {
+        return "expected a flavor such as DisableOverride";
+    }
+    static constexpr const char* of(Tag<Token<FlavorName>>) { return "expected a flavor such as DisableOverride"; }
+    static constexpr const char* of(Tag<Token<QualifierName>>) { return "expected a qualifier's name"; }
+    static constexpr const char* of(Tag<Token<DataType>>) { return "expected a data type"; }
+    static constexpr const char* of(Tag<Token<PragmaWord>>) { return "expected \"pragma\" after #"; }
+    static constexpr const char* of(Tag<Token<PragmaName>>) { return "expected the pragma's name, such as include"; }
+    static constexpr const char* of(Tag<StringValue>) { return "expected a string in quotation marks"; }
+    static constexpr const char* of(Tag<ClassOrInstance>) {
+        return "expected \"class\" or \"instance of\" after qualifiers";
+    }
+    static constexpr const char* of(Tag<FileEnd>) {
+        return "expected #pragma, \"qualifier\", \"class\", \"instance of\" or qualifiers in [ ]";
+    }
+    static constexpr const char* of(Tag<ArrayInitializer>) {
+        return "expected a list of values in braces, such as {1, 2} or {\"a\", \"b\"}";
+    }
+    static constexpr const char* of(Tag<LoneArrayEnd>) { return "expected nothing more after the closing brace"; }
+    static constexpr const char* of(Tag<Mark<'{'>>) { return "expected {"; }
+    static constexpr const char* of(Tag<Mark<'}'>>) { return "expected a comma or }"; }
+    static constexpr const char* of(Tag<Mark<'('>>) { return "expected ("; }
+    static constexpr const char* of(Tag<Mark<')'>>) { return "expected )"; }
+    static constexpr const char* of(Tag<Mark<']'>>) { return "expected a comma or ]"; }
+    static constexpr const char* of(Tag<Mark<':'>>) { return "expected :"; }
+    static constexpr const char* of(Tag<Mark<','>>) { return "expected a comma"; }
+    static constexpr const char* of(Tag<Mark<'='>>) { return "expected ="; }
+    static constexpr const char* of(Tag<Mark<';'>>) { return "expected ;"; }
 };
+
 template <typename Rule>
-using Control = peg::must_if<Errors>::control<Rule>;
+using Control = peg::must_if<Errors<Messages>>::template control<Rule>;
 
 }  // namespace cimhost::grammar::mof

@@ -40,15 +40,11 @@ std::string formatCharacter(Char16 character) {
 /** Some compilers accept literals of up to 1,023 bytes. A character takes up to six. */
 constexpr std::size_t longestLiteral = 1000;
 
-bool beginsCharacter(char byte) {
-    return (static_cast<unsigned char>(byte) & 0xC0U) != 0x80U;
-}
-
 /** The number of bytes of a string that fit into one literal. */
 std::size_t bytesOfLiteral(std::string_view string) {
     std::size_t written = 0;
     for (std::size_t position = 0; position < string.size(); ++position) {
-        if (written >= longestLiteral && beginsCharacter(string[position])) {
+        if (written >= longestLiteral && !cim::continuesCharacter(string[position])) {
             return position;
         }
         written += inQuotes(string.substr(position, 1)).size() - 2;

@@ -1,7 +1,5 @@
 #pragma once
 
-#include <tao/pegtl/must_if.hpp>
-
 #include "schema/LiteralGrammar.h"
 
 /** PEGTL rules for untyped WBEM URIs, [//host/][namespace:]Class[.Key=value,...], without white space. */
@@ -35,5 +33,33 @@ template <typename Rule>
 using Selected = peg::parse_tree::selector<
     Rule, LiteralNodes,
     peg::parse_tree::store_content::on<Host, NameSpace, ClassName, KeyName, StringPart, KeyValue, Key>>;
+
+/** Error messages, by rule. */
+struct Messages : NoMessages {
+    using NoMessages::of;
+    static constexpr const char* of(Tag<Host>) { return "expected a host name after //"; }
+    static constexpr const char* of(Tag<HostEnd>) { return "expected / after the host"; }
+    static constexpr const char* of(Tag<ClassName>) {
+        return "expected a class name, or a namespace such as root/cimv2 and a colon";
+    }
+    static constexpr const char* of(Tag<Key>) { return "expected Key=value"; }
+    static constexpr const char* of(Tag<KeyName>) { return "expected a key name"; }
+    static constexpr const char* of(Tag<Equals>) { return "expected = after the key name"; }
+    static constexpr const char* of(Tag<KeyValue>) {
+        return "expected a key's value: a string in quotation marks (a shell needs quotes around the whole path to "
+               "keep them), a number, true or false";
+    }
+    static constexpr const char* of(Tag<StringPart>) { return "expected the characters of a string"; }
+    static constexpr const char* of(Tag<StringEnd>) {
+        return "expected the closing quotation mark; in the string, write \\\" for a quotation mark and \\\\ for a "
+               "backslash";
+    }
+    static constexpr const char* of(Tag<PathEnd>) {
+        return "expected the end of the path, . and Key=value after the class, or a comma and another key";
+    }
+};
+
+template <typename Rule>
+using Control = peg::must_if<Errors<Messages>>::template control<Rule>;
 
 }  // namespace cimhost::grammar::path

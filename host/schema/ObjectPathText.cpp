@@ -1,59 +1,20 @@
 #include "schema/ObjectPathText.h"
 
-#include <algorithm>
-
 #include "cim/Names.h"
-#include "schema/CimType.h"
 #include "schema/Errors.h"
-#include "schema/MofValues.h"
+#include "schema/Literal.h"
 #include "schema/MofWriter.h"
 #include "schema/ObjectPathGrammar.h"
 #include "schema/StringLiteral.h"
-#include "schema/TypedElement.h"
 
 namespace cimhost {
 namespace {
 
 namespace path = grammar::path;
 namespace peg = tao::pegtl;
+using grammar::children;
+using grammar::findChild;
 using grammar::Node;
-
-template <typename Rule>
-inline constexpr const char* expected = nullptr;
-template <>
-inline constexpr auto expected<path::Host> = "expected a host name after //";
-template <>
-inline constexpr auto expected<path::HostEnd> = "expected / after the host";
-template <>
-inline constexpr auto expected<path::ClassName> =
-    "expected a class name, or a namespace such as root/cimv2 and a colon";
-template <>
-inline constexpr auto expected<path::Key> = "expected Key=value";
-template <>
-inline constexpr auto expected<path::KeyName> = "expected a key name";
-template <>
-inline constexpr auto expected<path::Equals> = "expected = after the key name";
-template <>
-inline constexpr auto expected<path::KeyValue> =
-    "expected a key's value: a string in quotation marks (a shell needs quotes around the whole path to keep them), a "
-    "number, true or false";
-template <>
-inline constexpr auto expected<path::StringPart> = "expected the characters of a string";
-template <>
-inline constexpr auto expected<path::StringEnd> =
-    "expected the closing quotation mark; in the string, write \\\" for a quotation mark and \\\\ for a backslash";
-template <>
-inline constexpr auto expected<path::PathEnd> =
-    "expected the end of the path, . and Key=value after the class, or a comma and another key";
-
-struct Errors {
-    template <typename Rule>
-    static constexpr const char* message = expected<Rule>;
-    template <typename Rule>
-    static constexpr bool raise_on_failure = false;
-};
-template <typename Rule>
-using Control = peg::must_if<Errors>::control<Rule>;
 
 Literal readKeyValue(const Node& node) {
     if (const Node* content = findChild<path::StringPart>(node)) {
@@ -98,8 +59,7 @@ Value keyValue(const Literal& literal, const std::string& name, const Property* 
 void addKey(ObjectPath& result, const Node& node, const Class* known, const Schema& schema,
             const std::string& defaultNameSpace) {
     const std::string name = findChild<path::KeyName>(node)->string();
-    const auto same = [&](const NamedValue& key) { return cim::sameName(key.name, name); };
-    if (std::any_of(result.keys.begin(), result.keys.end(), same)) {
+    if (cim::findNamed(result.keys, name) != nullptr) {
         throw PathError("key " + name + " is given twice");
     }
     const Literal literal = readKeyValue(*findChild<path::KeyValue>(node));
@@ -126,7 +86,7 @@ ObjectPath parseObjectPath(std::string_view uri, const Schema& schema, const std
     const std::string intro = "object path " + std::string(uri) + ": ";
     try {
         peg::memory_input<> input(uri.data(), uri.size(), "");
-        const auto root = peg::parse_tree::parse<path::Path, Node, path::Selected, peg::nothing, Control>(input);
+        const auto root = peg::parse_tree::parse<path::Path, Node, path::Selected, peg::nothing, path::Control>(input);
         return buildPath(*root, schema, defaultNameSpace);
     } catch (const peg::parse_error& error) {
         throw PathError(intro + "character " + std::to_string(error.positions().front().byte + 1) + ": " +

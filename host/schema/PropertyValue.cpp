@@ -1,15 +1,16 @@
 #include "schema/PropertyValue.h"
 
-#include "schema/CimType.h"
 #include "schema/Errors.h"
-#include "schema/MofValues.h"
+#include "schema/Literal.h"
+#include "schema/MofBuilder.h"
+#include "schema/MofMessages.h"
 #include "schema/ObjectPathGrammar.h"
 #include "schema/StringLiteral.h"
-#include "schema/TypedElement.h"
 
 namespace cimhost {
 namespace {
 
+namespace mof = grammar::mof;
 namespace path = grammar::path;
 namespace peg = tao::pegtl;
 
@@ -35,6 +36,24 @@ Literal readLiteral(std::string_view source) {
         return {std::string(source), source.empty() ? "an empty string" : std::string(source)};
     }
     return grammar::readLiteral(*root->children.front());
+}
+
+/** Reads an array in MOF's form, {1, 2} or {"a", "b"}. @throws ValueError if the source is not such a list */
+Value parseArray(std::string_view source, const Property& property, const Schema& schema,
+                 const std::string& defaultNameSpace) {
+    peg::memory_input<> input(source.data(), source.size(), property.name);
+    try {
+        const auto root =
+            peg::parse_tree::parse<mof::LoneArray, grammar::Node, mof::Selected, peg::nothing, mof::Control>(input);
+        Value value = Value::array(property.type, {});
+        for (const grammar::Node* constant : grammar::children<mof::Constant>(*root->children.front())) {
+            value.elements.push_back(typedElement(constantLiteral(*constant), property, schema, defaultNameSpace));
+        }
+        return value;
+    } catch (const peg::parse_error& error) {
+        throw ValueError("character " + std::to_string(error.positions().front().column) + ": " +
+                         std::string(error.message()));
+    }
 }
 
 Value parseValue(std::string_view source, const Property& property, const Schema& schema,

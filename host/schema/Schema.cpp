@@ -3,18 +3,10 @@
 #include <algorithm>
 #include <stdexcept>
 
-#include "schema/CimType.h"
-#include "schema/StandardQualifiers.h"
-
 namespace cimhost {
 namespace {
 
-template <typename Element>
-const Element* findNamed(const std::vector<Element>& elements, std::string_view name) {
-    const auto found = std::find_if(elements.begin(), elements.end(),
-                                    [&](const Element& element) { return cim::sameName(element.name, name); });
-    return found == elements.end() ? nullptr : &*found;
-}
+using cim::findNamed;
 
 bool isTrue(const Qualifier* qualifier) {
     if (qualifier == nullptr || qualifier->value.isNull) {

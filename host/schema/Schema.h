@@ -35,6 +35,9 @@ struct QualifierDeclaration {
     bool standard = false;  ///< declared by the CIM standard; a MOF file may declare it again
 };
 
+/** Declarations of the CIM standard's qualifiers, which MOF files may use without declaring them. */
+std::vector<QualifierDeclaration> standardQualifiers();
+
 /** A property or reference of a class. */
 struct Property {
     std::string name{};

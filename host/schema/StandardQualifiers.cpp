@@ -1,4 +1,4 @@
-#include "schema/StandardQualifiers.h"
+#include "schema/Schema.h"
 
 namespace cimhost {
 namespace {

@@ -4,7 +4,6 @@
 #include <fstream>
 #include <iostream>
 
-#include "schema/CimType.h"
 #include "schema/MofReader.h"
 
 namespace {
@@ -12,16 +11,9 @@ namespace {
 using cimhost::Class;
 using cimhost::Property;
 
-bool isWritable(const Property& property) {
-    const cimhost::Qualifier* write = property.findQualifier("Write");
-    const bool* flag =
-        write == nullptr || write->value.isNull ? nullptr : std::get_if<bool>(&write->value.elements.front());
-    return flag != nullptr && *flag;
-}
-
 void writeProperty(std::ostream& out, const Property& property) {
     out << "    {\"" << property.name << "\", " << property.type << " /* " << cimhost::typeName(property.type)
-        << " */, " << property.isKey() << ", " << isWritable(property) << ", ";
+        << " */, " << property.isKey() << ", " << property.isWritable() << ", ";
     if (property.referenceClass.empty()) {
         out << "nullptr},\n";
     } else {

@@ -1,4 +1,4 @@
-#include "framework/AgentSettings.h"
+#include "framework/AgentState.h"
 
 #include "agent/ShippedConfiguration.h"
 #include "configuration/FileContent.h"

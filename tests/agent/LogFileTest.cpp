@@ -1,4 +1,4 @@
-#include "logging/LogFile.h"
+#include "logging/Sinks.h"
 
 #include "agent/TemporaryDirectory.h"
 

@@ -1,4 +1,4 @@
-#include "framework/NodePath.h"
+#include "framework/NodeTree.h"
 
 #include <gtest/gtest.h>
 

@@ -28,9 +28,9 @@ std::vector<std::string> environmentWith(const std::string& configuration) {
     return variables;
 }
 
-std::vector<char*> pointersTo(std::vector<std::string>& texts) {
+std::vector<char*> pointersTo(std::vector<std::string>& strings) {
     std::vector<char*> pointers;
-    for (std::string& text : texts) {
+    for (std::string& text : strings) {
         pointers.push_back(text.data());
     }
     pointers.push_back(nullptr);

@@ -1,4 +1,4 @@
-#include "framework/ReplacementFile.h"
+#include "framework/FileAccess.h"
 
 #include "KO/Exceptions.h"
 #include "agent/TemporaryDirectory.h"

@@ -1,4 +1,4 @@
-#include "configuration/TomlNesting.h"
+#include "configuration/Document.h"
 
 #include "configuration/Document.h"
 

@@ -60,8 +60,8 @@ fs::path goldenFile(const Scenario& scenario) {
 }
 
 bool isUpdate() {
-    const char* wish = std::getenv("UPDATE_GOLDEN");
-    return wish != nullptr && std::string(wish) == "1";
+    const char* update = std::getenv("UPDATE_GOLDEN");
+    return update != nullptr && std::string(update) == "1";
 }
 
 class TranscriptGoldenTest : public TranscriptTest, public testing::WithParamInterface<Scenario> {};

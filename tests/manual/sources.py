@@ -55,5 +55,5 @@ VALUE = re.compile(r"\$\([^)]*\)|\$\{[^}]*\}|\$\w+|\$[@*?]|@\w+@")
 
 def shell_messages(text, placeholder):
     """Returns the messages of a shell script, with a placeholder for each value."""
-    texts = [VALUE.sub(placeholder, each[1] or each[2] or "") for each in MESSAGE.finditer(text)]
-    return [each for each in texts if is_prose(each.replace(placeholder, ""))]
+    messages = [VALUE.sub(placeholder, each[1] or each[2] or "") for each in MESSAGE.finditer(text)]
+    return [each for each in messages if is_prose(each.replace(placeholder, ""))]

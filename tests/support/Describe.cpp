@@ -29,45 +29,45 @@ std::string describeValue(const CMPIValue* value, CMPIType type) {
 }  // namespace
 
 void Description::add(const char* text) {
-    texts.emplace_back(text == nullptr ? "null" : text);
+    strings.emplace_back(text == nullptr ? "null" : text);
 }
 
 void Description::add(const char** names) {
     if (names == nullptr) {
-        texts.emplace_back("null");
+        strings.emplace_back("null");
         return;
     }
     std::string list;
     for (; *names != nullptr; ++names) {
         list += (list.empty() ? "" : ",") + std::string(*names);
     }
-    texts.push_back("{" + list + "}");
+    strings.push_back("{" + list + "}");
 }
 
 void Description::add(const CMPIObjectPath* path) {
-    texts.push_back(describeContent(path, cimhost::formatObjectPath));
+    strings.push_back(describeContent(path, cimhost::formatObjectPath));
 }
 
 void Description::add(const CMPIInstance* instance) {
-    texts.push_back(
+    strings.push_back(
         describeContent(instance, [](const auto& content) { return formatObjectPath(content.value.path); }));
 }
 
 void Description::add(const CMPIString* string) {
-    texts.push_back(describeContent(string, [](const std::string& text) { return text; }));
+    strings.push_back(describeContent(string, [](const std::string& text) { return text; }));
 }
 
 void Description::add(const CMPIValue* value) {
-    pending = {value, texts.size()};
-    texts.emplace_back("value");
+    pending = {value, strings.size()};
+    strings.emplace_back("value");
 }
 
 void Description::add(CMPIType type) {
     if (pending.position) {
-        texts[*pending.position] = describeValue(pending.value, type);
+        strings[*pending.position] = describeValue(pending.value, type);
         pending = {};
     }
-    texts.push_back(std::to_string(type));
+    strings.push_back(std::to_string(type));
 }
 
 }  // namespace testsupport

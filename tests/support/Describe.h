@@ -38,10 +38,10 @@ public:
     void add(const CMPIString* string);
     void add(const CMPIValue* value);
     void add(CMPIType type);  ///< also describes a preceding value
-    void add(CMPIBoolean flag) { texts.push_back(std::to_string(flag)); }
-    void add(int number) { texts.push_back(std::to_string(number)); }
-    void add(CMPICount number) { texts.push_back(std::to_string(number)); }
-    void add(CMPIUint64 number) { texts.push_back(std::to_string(number)); }
+    void add(CMPIBoolean flag) { strings.push_back(std::to_string(flag)); }
+    void add(int number) { strings.push_back(std::to_string(number)); }
+    void add(CMPICount number) { strings.push_back(std::to_string(number)); }
+    void add(CMPIUint64 number) { strings.push_back(std::to_string(number)); }
 
     /** Other types: pointers for output, brokers, contexts and so on have no description. */
     template <class Other>
@@ -55,7 +55,7 @@ public:
         }
     }
 
-    std::vector<std::string> texts;
+    std::vector<std::string> strings;
 
 private:
     ValueArgument pending;
@@ -69,7 +69,7 @@ std::vector<std::string> describeAll(const First& first, const Others&... others
         description.add(first);
     }
     (description.add(others), ...);
-    return description.texts;
+    return description.strings;
 }
 
 inline std::vector<std::string> describeAll() {

@@ -2,7 +2,7 @@
 
 #include <cstdarg>
 
-#include "broker/Messages.h"
+#include "broker/FunctionTables.h"
 
 // The function tables of RecordingBroker: each slot is the recording function of the standard tables' slot.
 

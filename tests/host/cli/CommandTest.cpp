@@ -21,8 +21,8 @@ TEST(Command, LongAndShortNamesDoTheSame) {
         {"reference-names", "rin"}};
     for (const auto& [full, brief] : names) {
         const std::string target = std::string(brief).substr(0, 2) == "ei" ? "Test_Box" : boxA;
-        const Ended one = run({full, target});
-        const Ended other = run({brief, target});
+        const ProgramResult one = run({full, target});
+        const ProgramResult other = run({brief, target});
         EXPECT_EQ(one.status, other.status) << full;
         EXPECT_EQ(one.output, other.output) << full;
         EXPECT_EQ(one.error, other.error) << full;
@@ -31,7 +31,7 @@ TEST(Command, LongAndShortNamesDoTheSame) {
 }
 
 TEST(GetInstance, ShowsOneInstance) {
-    const Ended got = run({"gi", "Test_Box.Name=\"B\""});
+    const ProgramResult got = run({"gi", "Test_Box.Name=\"B\""});
     EXPECT_EQ(got.status, 0);
     EXPECT_EQ(got.output, "root/cimv2:Test_Box.Name=\"B\"\n  Name  string  \"B\"\n  Note  string  NULL\n");
 }
@@ -49,20 +49,20 @@ TEST(GetInstance, TakesTheNamespaceFromThePathOrFromTheOption) {
 }
 
 TEST(GetInstance, NotFoundIsError6) {
-    const Ended got = run({"gi", "Test_Box.Name=\"none\""});
+    const ProgramResult got = run({"gi", "Test_Box.Name=\"none\""});
     EXPECT_EQ(got.status, 1);
     EXPECT_EQ(got.output, "");
     EXPECT_THAT(got.error, AllOf(StartsWith("cimhost: error 6 (CMPI_RC_ERR_NOT_FOUND): "), HasSubstr("none")));
 }
 
 TEST(CreateInstance, ShowsThePathOfTheNewInstance) {
-    const Ended created = run({"ci", "Test_Box.Name=\"new\"", "Size=3"});
+    const ProgramResult created = run({"ci", "Test_Box.Name=\"new\"", "Size=3"});
     EXPECT_EQ(created.status, 0) << created.error;
     EXPECT_EQ(created.output, "root/cimv2:Test_Box.Name=\"new\"\n");
 }
 
 TEST(CreateInstance, GivesTheProviderKeysAndValues) {
-    const Ended created = run({"--raw", "ci", "Test_Box.Name=\"new\"", "Size=3", "--null", "Note"});
+    const ProgramResult created = run({"--raw", "ci", "Test_Box.Name=\"new\"", "Size=3", "--null", "Note"});
     EXPECT_THAT(created.output, HasSubstr(R"(2. instance root/cimv2:Test_Box.Name="new"
      Name  string  "new"
      Size  uint32  3
@@ -73,27 +73,27 @@ TEST(CreateInstance, GivesTheProviderKeysAndValues) {
 TEST(CreateInstance, AKeyMayStandInThePathOrAmongTheValues) {
     EXPECT_EQ(run({"ci", "Test_Box", "Name=new"}).output, "root/cimv2:Test_Box.Name=\"new\"\n");
     EXPECT_EQ(run({"ci", "Test_Box.Name=\"new\"", "Name=new"}).status, 0);
-    const Ended different = run({"ci", "Test_Box.Name=\"new\"", "Name=old"});
+    const ProgramResult different = run({"ci", "Test_Box.Name=\"new\"", "Name=old"});
     EXPECT_EQ(different.status, 2);
     EXPECT_THAT(different.error, HasSubstr("key Name has one value in the path and another one after it"));
     EXPECT_THAT(run({"ci", "Test_Box", "--null", "Name"}).error, HasSubstr("key Name cannot be null"));
 }
 
 TEST(CreateInstance, AnExistingInstanceIsError11) {
-    const Ended created = run({"ci", boxA});
+    const ProgramResult created = run({"ci", boxA});
     EXPECT_EQ(created.status, 1);
     EXPECT_EQ(created.error, "cimhost: error 11 (CMPI_RC_ERR_ALREADY_EXISTS): there is a box A\n");
 }
 
 TEST(ModifyInstance, SaysNothingWhenItSucceeds) {
-    const Ended modified = run({"mi", boxA, "Size=5"});
+    const ProgramResult modified = run({"mi", boxA, "Size=5"});
     EXPECT_EQ(modified.status, 0);
     EXPECT_EQ(modified.output, "");
     EXPECT_EQ(modified.error, "");
 }
 
 TEST(ModifyInstance, TypesEveryValueByTheClass) {
-    const Ended modified =
+    const ProgramResult modified =
         run({"--raw", "modify-instance", boxA, "Size=0x10", "open=TRUE", "Packed=20260131120000.000000+060",
              "Labels={\"a, b\", \"c\"}", "Shelf=-128", "Mark=x", "Weight=1", "Inside=Test_Box.Name=\"B\"",
              "Note=null = \"nothing\"", "--null", "Serial"});
@@ -114,16 +114,16 @@ TEST(ModifyInstance, TypesEveryValueByTheClass) {
 }
 
 TEST(ModifyInstance, AFailureWithoutAMessageStillHasItsCode) {
-    const Ended modified = run({"mi", "Test_Box.Name=\"B\"", "Size=5"});
+    const ProgramResult modified = run({"mi", "Test_Box.Name=\"B\"", "Size=5"});
     EXPECT_EQ(modified.status, 1);
     EXPECT_THAT(modified.error, StartsWith("cimhost: error 6 (CMPI_RC_ERR_NOT_FOUND)"));
 }
 
 TEST(DeleteInstance, SaysNothingWhenItSucceedsAndWhyWhenItDoesNot) {
-    const Ended deleted = run({"di", boxA});
+    const ProgramResult deleted = run({"di", boxA});
     EXPECT_EQ(deleted.status, 0);
     EXPECT_EQ(deleted.output + deleted.error, "");
-    const Ended missing = run({"di", "Test_Box.Name=\"B\""});
+    const ProgramResult missing = run({"di", "Test_Box.Name=\"B\""});
     EXPECT_EQ(missing.status, 1);
     EXPECT_EQ(missing.error,
               "cimhost: error 6 (CMPI_RC_ERR_NOT_FOUND): no such box\n"
@@ -131,14 +131,14 @@ TEST(DeleteInstance, SaysNothingWhenItSucceedsAndWhyWhenItDoesNot) {
 }
 
 TEST(Associators, ShowTheInstancesAtTheOtherEnd) {
-    const Ended found = run({"ai", boxA, "--assoc-class", "Test_Contains"});
+    const ProgramResult found = run({"ai", boxA, "--assoc-class", "Test_Contains"});
     EXPECT_EQ(found.status, 0) << found.error;
     EXPECT_THAT(found.output, StartsWith("root/cimv2:Test_Box.Name=\"B\"\n"));
 }
 
 TEST(Associators, PassTheirFiltersOn) {
-    const Ended found = run({"ain", boxA, "--assoc-class", "Test_Contains", "--result-class", "Test_Box", "--role",
-                             "Outer", "--result-role", "Inner"});
+    const ProgramResult found = run({"ain", boxA, "--assoc-class", "Test_Contains", "--result-class", "Test_Box",
+                                     "--role", "Outer", "--result-role", "Inner"});
     EXPECT_EQ(found.output, "root/cimv2:Test_Box.Name=\"Test_Contains|Test_Box|Outer|Inner\"\n");
     EXPECT_EQ(run({"ain", boxA, "--assoc-class", "Test_Contains"}).output,
               "root/cimv2:Test_Box.Name=\"Test_Contains|-|-|-\"\n");
@@ -155,7 +155,7 @@ TEST(References, ShowTheAssociations) {
 }
 
 TEST(Associators, OfAClassThatNoProviderAssociatesAreError5) {
-    const Ended found = run({"ai", boxA, "--assoc-class", "Test_Box"});
+    const ProgramResult found = run({"ai", boxA, "--assoc-class", "Test_Box"});
     EXPECT_EQ(found.status, 1);
     EXPECT_THAT(found.error, StartsWith("cimhost: error 5 (CMPI_RC_ERR_INVALID_CLASS): "));
 }
@@ -170,7 +170,7 @@ TEST(Error, OfAClassWithoutProviderIsError5AndOfAnUnknownNamespaceError3) {
 }
 
 TEST(Error, EachProviderStatusIsShownWithCodeAndName) {
-    const Ended failed = run({"gi", "Test_Answer.Code=13"});
+    const ProgramResult failed = run({"gi", "Test_Answer.Code=13"});
     EXPECT_EQ(failed.status, 1);
     EXPECT_EQ(failed.output, "");
     EXPECT_EQ(failed.error, "cimhost: error 13 (CMPI_RC_ERR_TYPE_MISMATCH): as you\\nlike \"it\"\n")
@@ -180,7 +180,7 @@ TEST(Error, EachProviderStatusIsShownWithCodeAndName) {
 }
 
 TEST(Error, AnExceptionOfAProviderIsError1AndDoesNotEndTheProgram) {
-    const Ended thrown = run({"gi", "Test_Answer.Code=999"});
+    const ProgramResult thrown = run({"gi", "Test_Answer.Code=999"});
     EXPECT_EQ(thrown.status, 1);
     EXPECT_THAT(thrown.error, AllOf(StartsWith("cimhost: error 1 (CMPI_RC_ERR_FAILED): "), HasSubstr("wit's end")));
 }

@@ -11,7 +11,7 @@ using Json = nlohmann::ordered_json;
 
 Json jsonOf(std::vector<std::string> arguments) {
     arguments.insert(arguments.begin(), {"--format", "json"});
-    const Ended shown = run(arguments);
+    const ProgramResult shown = run(arguments);
     EXPECT_EQ(shown.status, 0) << shown.error;
     return Json::parse(shown.output);
 }

@@ -17,7 +17,7 @@ Environment testEnvironment() {
 }
 
 TEST(Location, ComesFromTheEnvironment) {
-    const Ended listed = runBare({"ein", "Test_Box"}, testEnvironment());
+    const ProgramResult listed = runBare({"ein", "Test_Box"}, testEnvironment());
     EXPECT_EQ(listed.status, 0) << listed.error;
     EXPECT_THAT(listed.output, HasSubstr("Test_Box.Name=\"A\""));
 }
@@ -25,7 +25,7 @@ TEST(Location, ComesFromTheEnvironment) {
 TEST(Location, OptionsComeBeforeTheEnvironment) {
     const TemporaryDirectory directory;
     const std::string other = directory.write("other.mof", "class Other { [Key] string K; };");
-    const Ended listed = runBare({"--schema", other, "classes"}, testEnvironment());
+    const ProgramResult listed = runBare({"--schema", other, "classes"}, testEnvironment());
     EXPECT_THAT(listed.output, AllOf(StartsWith("Other "), HasSubstr("Test_Box"), HasSubstr("(not in the schema)")));
 }
 
@@ -44,7 +44,7 @@ TEST(Location, ADirectoryMeansItsFilesAndSeveralCanBeNamed) {
 }
 
 TEST(Location, WithoutAnyItIsTheDataDirectoryBesideTheProgram) {
-    const Ended listed = runBare({"classes"});
+    const ProgramResult listed = runBare({"classes"});
     EXPECT_EQ(listed.status, 0) << listed.error;
     EXPECT_NE(listed.output, "");
     EXPECT_EQ(listed.error, "");
@@ -52,7 +52,7 @@ TEST(Location, WithoutAnyItIsTheDataDirectoryBesideTheProgram) {
 
 struct MissingFile {
     std::vector<std::string> arguments;
-    const char* complaint;
+    const char* message;
 };
 void PrintTo(const MissingFile& missing, std::ostream* out) {
     *out << missing.arguments.front();
@@ -60,10 +60,10 @@ void PrintTo(const MissingFile& missing, std::ostream* out) {
 
 class CannotLoad : public testing::TestWithParam<MissingFile> {};
 TEST_P(CannotLoad, IsExitStatus3WithAReason) {
-    const Ended refused = runBare(GetParam().arguments, testEnvironment());
+    const ProgramResult refused = runBare(GetParam().arguments, testEnvironment());
     EXPECT_EQ(refused.status, 3);
     EXPECT_EQ(refused.output, "");
-    EXPECT_THAT(refused.error, AllOf(StartsWith("cimhost: "), HasSubstr(GetParam().complaint)));
+    EXPECT_THAT(refused.error, AllOf(StartsWith("cimhost: "), HasSubstr(GetParam().message)));
 }
 INSTANTIATE_TEST_SUITE_P(
     Files, CannotLoad,
@@ -79,7 +79,7 @@ INSTANTIATE_TEST_SUITE_P(
 
 TEST(CannotLoad, ADirectoryWithoutSuchFilesNamesTheOption) {
     const TemporaryDirectory directory;
-    const Ended refused = runBare({"--schema", directory.path.string(), "classes"}, testEnvironment());
+    const ProgramResult refused = runBare({"--schema", directory.path.string(), "classes"}, testEnvironment());
     EXPECT_EQ(refused.status, 3);
     EXPECT_THAT(refused.error, AllOf(HasSubstr("no schema"), HasSubstr("--schema"), HasSubstr("CIMHOST_SCHEMA")));
 }
@@ -87,7 +87,8 @@ TEST(CannotLoad, ADirectoryWithoutSuchFilesNamesTheOption) {
 TEST(CannotLoad, ALibraryThatIsNone) {
     const TemporaryDirectory directory;
     directory.write("libcli_test_provider.so", "this is no library");
-    const Ended refused = runBare({"--library-path", directory.path.string(), "ei", "Test_Box"}, testEnvironment());
+    const ProgramResult refused =
+        runBare({"--library-path", directory.path.string(), "ei", "Test_Box"}, testEnvironment());
     EXPECT_EQ(refused.status, 3);
     EXPECT_THAT(refused.error, HasSubstr("libcli_test_provider.so"));
 }
@@ -95,7 +96,7 @@ TEST(CannotLoad, ALibraryThatIsNone) {
 TEST(Output, ThatCannotBeWrittenIsExitStatus4) {
     for (const std::vector<std::string>& arguments :
          {std::vector<std::string>{"ei", "Test_Box"}, {"--help"}, {"--format", "json", "classes"}}) {
-        const Ended refused = runBare(arguments, testEnvironment(), "/dev/full");
+        const ProgramResult refused = runBare(arguments, testEnvironment(), "/dev/full");
         EXPECT_EQ(refused.status, 4) << arguments.front();
         EXPECT_THAT(refused.error, StartsWith("cimhost: the output cannot be written: ")) << arguments.front();
     }

@@ -25,10 +25,10 @@ std::string contentOf(const std::filesystem::path& file) {
 }
 
 /** The array for exec, terminated by a null pointer. */
-std::vector<char*> pointersTo(std::vector<std::string>& texts) {
+std::vector<char*> pointersTo(std::vector<std::string>& strings) {
     std::vector<char*> pointers;
-    pointers.reserve(texts.size() + 1);
-    for (std::string& text : texts) {
+    pointers.reserve(strings.size() + 1);
+    for (std::string& text : strings) {
         pointers.push_back(text.data());
     }
     pointers.push_back(nullptr);
@@ -55,8 +55,8 @@ void redirect(const std::string& file, int descriptor) {
 
 }  // namespace
 
-Ended runBare(const std::vector<std::string>& arguments, const Environment& environment,
-              const std::string& outputFile) {
+ProgramResult runBare(const std::vector<std::string>& arguments, const Environment& environment,
+                      const std::string& outputFile) {
     const TemporaryDirectory directory;
     const std::string output = outputFile.empty() ? (directory.path / "output").string() : outputFile;
     const std::string error = directory.path / "error";
@@ -105,7 +105,8 @@ std::string shownOn(int terminal) {
 
 }  // namespace
 
-Ended runOnTerminal(std::vector<std::string> arguments, unsigned short columns, const Environment& environment) {
+ProgramResult runOnTerminal(std::vector<std::string> arguments, unsigned short columns,
+                            const Environment& environment) {
     const std::string program = testsupport::underTest(CIMHOST_PROGRAM);
     addTestClasses(arguments);
     arguments.insert(arguments.begin(), program);
@@ -128,7 +129,7 @@ Ended runOnTerminal(std::vector<std::string> arguments, unsigned short columns, 
     return {WIFEXITED(status) ? WEXITSTATUS(status) : -1, shown, ""};
 }
 
-Ended run(std::vector<std::string> arguments) {
+ProgramResult run(std::vector<std::string> arguments) {
     addTestClasses(arguments);
     return runBare(arguments);
 }

@@ -6,7 +6,7 @@
 namespace cimhost::test {
 
 /** The output and exit status of a run of the program. */
-struct Ended {
+struct ProgramResult {
     int status = -1;  ///< exit status; -1 if a signal ended it
     std::string output{};
     std::string error{};
@@ -15,15 +15,17 @@ struct Ended {
 /** Environment variables, "NAME=VALUE". Other variables of cimhost are not set. */
 using Environment = std::vector<std::string>;
 
-/** Runs cimhost with these arguments only. @param outputFile receives standard output instead of Ended::output */
-Ended runBare(const std::vector<std::string>& arguments, const Environment& environment = {},
-              const std::string& outputFile = "");
+/** Runs cimhost with these arguments only. @param outputFile receives standard output instead of ProgramResult::output
+ */
+ProgramResult runBare(const std::vector<std::string>& arguments, const Environment& environment = {},
+                      const std::string& outputFile = "");
 
 /** Runs cimhost on a terminal with this number of columns, which receives both streams. */
-Ended runOnTerminal(std::vector<std::string> arguments, unsigned short columns, const Environment& environment = {});
+ProgramResult runOnTerminal(std::vector<std::string> arguments, unsigned short columns,
+                            const Environment& environment = {});
 
 /** Runs cimhost with the test classes and their provider. */
-Ended run(std::vector<std::string> arguments);
+ProgramResult run(std::vector<std::string> arguments);
 
 /** A file of the test's data. */
 std::string dataFile(const std::string& name);

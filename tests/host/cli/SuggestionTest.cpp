@@ -18,7 +18,7 @@ void PrintTo(const Misspelt& line, std::ostream* out) {
 
 class Misspelling : public testing::TestWithParam<Misspelt> {};
 TEST_P(Misspelling, IsReportedWithASuggestion) {
-    const Ended refused = run(GetParam().arguments);
+    const ProgramResult refused = run(GetParam().arguments);
     EXPECT_NE(refused.status, 0);
     EXPECT_THAT(refused.error, HasSubstr(std::string("did you mean ") + GetParam().suggestion + "?"));
 }
@@ -47,7 +47,7 @@ void PrintTo(const Refused& line, std::ostream* out) {
 
 class Hint : public testing::TestWithParam<Refused> {};
 TEST_P(Hint, NamesTheCommandThatHelps) {
-    const Ended refused = run(GetParam().arguments);
+    const ProgramResult refused = run(GetParam().arguments);
     EXPECT_NE(refused.status, 0);
     EXPECT_THAT(refused.error, HasSubstr(GetParam().hint));
 }

@@ -41,7 +41,7 @@ TEST(Colours, AreForTerminalsOnly) {
 
 TEST(Colours, AreOmittedIfTheyAreNotWanted) {
     for (const char* variable : {"NO_COLOR=1", "TERM=dumb"}) {
-        const Ended shown = runOnTerminal({"ei", "Test_Box"}, wideTerminal, {variable});
+        const ProgramResult shown = runOnTerminal({"ei", "Test_Box"}, wideTerminal, {variable});
         EXPECT_EQ(shown.output, run({"ei", "Test_Box"}).output) << variable;
     }
     EXPECT_THAT(runOnTerminal({"--color", "never", "ei", "Test_Box"}, wideTerminal).output, Not(HasSubstr(escape)));
@@ -58,13 +58,14 @@ TEST(Colours, AreUsedIfTheyAreRequested) {
 
 TEST(Colours, AreNotForPrograms) {
     for (const char* format : {"json", "mof"}) {
-        const Ended shown = runOnTerminal({"--color", "always", "--format", format, "ei", "Test_Box"}, wideTerminal);
+        const ProgramResult shown =
+            runOnTerminal({"--color", "always", "--format", format, "ei", "Test_Box"}, wideTerminal);
         EXPECT_EQ(shown.output, run({"--format", format, "ei", "Test_Box"}).output);
     }
 }
 
 TEST(Colours, HaveThreeWords) {
-    const Ended refused = run({"--color", "blue", "ei", "Test_Box"});
+    const ProgramResult refused = run({"--color", "blue", "ei", "Test_Box"});
     EXPECT_EQ(refused.status, 2);
     EXPECT_THAT(refused.error, HasSubstr("blue not in {auto,always,never}"));
 }

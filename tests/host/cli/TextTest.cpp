@@ -6,7 +6,7 @@ namespace cimhost::test {
 namespace {
 
 TEST(TextOutput, ShowsInstancesWithAlignedNamesTypesAndValues) {
-    const Ended listed = run({"enumerate-instances", "Test_Box"});
+    const ProgramResult listed = run({"enumerate-instances", "Test_Box"});
     EXPECT_EQ(listed.status, 0);
     EXPECT_EQ(listed.error, "");
     EXPECT_EQ(listed.output, R"(root/cimv2:Test_Box.Name="A"
@@ -29,13 +29,13 @@ root/cimv2:Test_Box.Name="B"
 }
 
 TEST(TextOutput, ShowsPathsOnePerLine) {
-    const Ended listed = run({"enumerate-instance-names", "Test_Box"});
+    const ProgramResult listed = run({"enumerate-instance-names", "Test_Box"});
     EXPECT_EQ(listed.status, 0);
     EXPECT_EQ(listed.output, "root/cimv2:Test_Box.Name=\"A\"\nroot/cimv2:Test_Box.Name=\"B\"\n");
 }
 
 TEST(TextOutput, ListsClassesWithTheirProviders) {
-    const Ended listed = run({"classes"});
+    const ProgramResult listed = run({"classes"});
     EXPECT_EQ(listed.status, 0);
     EXPECT_EQ(
         listed.output,
@@ -51,7 +51,7 @@ TEST(TextOutput, ListsClassesWithTheirProviders) {
 }
 
 TEST(MofOutput, ShowsInstancesAsAMofCompilerTakesThem) {
-    const Ended listed = run({"--format", "mof", "ei", "Test_Box"});
+    const ProgramResult listed = run({"--format", "mof", "ei", "Test_Box"});
     EXPECT_EQ(listed.status, 0);
     EXPECT_EQ(listed.output, R"(instance of Test_Box {
     Name = "A";

@@ -10,7 +10,7 @@ using testing::HasSubstr;
 using testing::StartsWith;
 
 TEST(Help, ShowsCommandsOptionsAndExamples) {
-    const Ended help = runBare({"--help"});
+    const ProgramResult help = runBare({"--help"});
     EXPECT_EQ(help.status, 0);
     EXPECT_EQ(help.error, "");
     for (const char* part : {"enumerate-instances, ei", "modify-instance, mi", "--schema", "--library-path", "--raw",
@@ -21,7 +21,7 @@ TEST(Help, ShowsCommandsOptionsAndExamples) {
 
 TEST(Help, EachCommandHasHelp) {
     for (const char* command : {"ei", "ein", "gi", "ci", "mi", "di", "ai", "ain", "ri", "rin", "classes"}) {
-        const Ended help = runBare({command, "--help"});
+        const ProgramResult help = runBare({command, "--help"});
         EXPECT_EQ(help.status, 0) << command;
         EXPECT_THAT(help.output, HasSubstr("Usage: cimhost ")) << command;
     }
@@ -30,14 +30,14 @@ TEST(Help, EachCommandHasHelp) {
 }
 
 TEST(Version, IsANumberOnOneLine) {
-    const Ended version = runBare({"--version"});
+    const ProgramResult version = runBare({"--version"});
     EXPECT_EQ(version.status, 0);
     EXPECT_THAT(version.output, testing::MatchesRegex("cimhost [0-9]+\\.[0-9]+\\.[0-9]+\n"));
 }
 
 struct WrongLine {
     std::vector<std::string> arguments;
-    const char* complaint;
+    const char* message;
 };
 void PrintTo(const WrongLine& line, std::ostream* out) {
     for (const std::string& word : line.arguments) {
@@ -47,10 +47,10 @@ void PrintTo(const WrongLine& line, std::ostream* out) {
 
 class WrongUsage : public testing::TestWithParam<WrongLine> {};
 TEST_P(WrongUsage, IsExitStatus2WithAReason) {
-    const Ended refused = run(GetParam().arguments);
+    const ProgramResult refused = run(GetParam().arguments);
     EXPECT_EQ(refused.status, 2);
     EXPECT_EQ(refused.output, "");
-    EXPECT_THAT(refused.error, AllOf(StartsWith("cimhost: "), HasSubstr(GetParam().complaint)));
+    EXPECT_THAT(refused.error, AllOf(StartsWith("cimhost: "), HasSubstr(GetParam().message)));
 }
 
 INSTANTIATE_TEST_SUITE_P(

@@ -114,7 +114,7 @@ constexpr auto everything = R"(
         [Key] string Key;
         boolean Flag; char16 Sign; uint8 U8; uint16 U16; uint32 U32; uint64 U64; sint8 S8; sint16 S16; sint32 S32;
         sint64 S64; real32 R32; real64 R64; string Text; datetime Time; Other REF Link;
-        boolean Flags[]; char16 Signs[]; uint64 Many[]; real64 Reals[]; string Texts[]; datetime Times[]; string None;
+        boolean Flags[]; char16 Signs[]; uint64 Many[]; real64 Reals[]; string Words[]; datetime Times[]; string None;
     };)";
 
 constexpr auto filled = R"(instance of Every {
@@ -138,7 +138,7 @@ constexpr auto filled = R"(instance of Every {
     Signs = {'a', '\x0000'};
     Many = {0, 18446744073709551615};
     Reals = {0.5, 1.0e+100};
-    Texts = {"", "{a, b}", NULL};
+    Words = {"", "{a, b}", NULL};
     Times = {"00000001000000.000000:000"};
     None = NULL;
 };

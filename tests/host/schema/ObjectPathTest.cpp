@@ -170,7 +170,7 @@ TEST_P(MalformedPath, IsRejectedWithItsPosition) {
     EXPECT_THAT(refusal(GetParam().text), HasSubstr(GetParam().expected));
 }
 INSTANTIATE_TEST_SUITE_P(
-    Texts, MalformedPath,
+    Paths, MalformedPath,
     testing::Values(BadPath{"", "character 1: expected a class name"},
                     BadPath{"Disk.", "character 6: expected a key name"}, BadPath{"Disk.ID", "character 8: expected ="},
                     BadPath{"Disk.ID=", "character 9: expected a key's"},

@@ -14,7 +14,7 @@ const Schema& everySchema() {
         class Disk { [Key] string ID; };
         class Every {
             boolean Flag; char16 Sign; uint8 U8; sint64 S64; real32 R32; string Text; datetime Time; Disk REF Link;
-            uint16 Numbers[]; string Texts[]; Disk REF Links[];
+            uint16 Numbers[]; string Words[]; Disk REF Links[];
         };)");
     return known;
 }
@@ -70,7 +70,7 @@ TEST(PropertyValue, AReferenceIsAPathWithoutQuotationMarks) {
 TEST(PropertyValue, AnArrayIsAListInBraces) {
     EXPECT_EQ(formatMof(parse("Numbers", "{1, 0x10,3}")), "{1, 16, 3}");
     EXPECT_EQ(formatMof(parse("Numbers", " { } ")), "{}");
-    EXPECT_EQ(formatMof(parse("Texts", R"({"a, b", "c\"d"})")), R"({"a, b", "c\"d"})");
+    EXPECT_EQ(formatMof(parse("Words", R"({"a, b", "c\"d"})")), R"({"a, b", "c\"d"})");
     EXPECT_EQ(formatMof(parse("Links", R"({"Disk.ID=\"x\""})")), R"({"root/cimv2:Disk.ID=\"x\""})");
 }
 

@@ -3,7 +3,7 @@
 #include <algorithm>
 
 #include "host/schema/Schemas.h"
-#include "schema/CimType.h"
+#include "model/Value.h"
 
 namespace cimhost::test {
 namespace {

@@ -3,7 +3,6 @@
 #include <CLI/CLI.hpp>
 #include <limits>
 
-#include "cli/ExitStatus.h"
 #include "lab/load/Load.h"
 #include "lab/program/LoadReport.h"
 #include "schema/ObjectPathText.h"

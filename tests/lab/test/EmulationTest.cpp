@@ -66,13 +66,13 @@ protected:
     }
 
     /** The provider's description when this class is enumerated. */
-    std::string told(const char* className) {
+    std::string reported(const char* className) {
         const auto found = manager().perform(Request::enumerateInstances(classPath(className)));
         EXPECT_TRUE(found.ok()) << found.status.message;
         return found.instances.empty() ? "" : stringOf(found.instance().properties, "Text").value_or("");
     }
 
-    std::string seen() { return told("Echo_Seen"); }
+    std::string seen() { return reported("Echo_Seen"); }
 
     cimhost::Response create(const char* className) {
         return manager().perform(Request::createInstance(path(className, "a"), {}));
@@ -111,11 +111,11 @@ TEST_F(EmulationTest, ManagersHaveNames) {
 
 TEST_F(EmulationTest, TheBrokerHasVersionsAndGaps) {
     as(Manager::standard);
-    EXPECT_EQ(told("Echo_Broker"), "version 200/200");
+    EXPECT_EQ(reported("Echo_Broker"), "version 200/200");
     as(Manager::sfcb);
-    EXPECT_EQ(told("Echo_Broker"), "version 0/1, no errors and messages, no joining, only marks");
+    EXPECT_EQ(reported("Echo_Broker"), "version 0/1, no errors and messages, no joining, only marks");
     as(Manager::openPegasus);
-    EXPECT_EQ(told("Echo_Broker"), "version 200/200, no memory table");
+    EXPECT_EQ(reported("Echo_Broker"), "version 200/200, no memory table");
 }
 
 TEST_F(EmulationTest, ThePrincipalIsEmptyOrLacksCharacters) {
@@ -328,20 +328,20 @@ TEST_F(EmulationTest, ARequestRunsOnTheCallersThreadOrASeparateOne) {
     std::ostringstream mine;
     mine << std::this_thread::get_id();
     as(Manager::standard);
-    EXPECT_EQ(told("Echo_Thread"), mine.str());
+    EXPECT_EQ(reported("Echo_Thread"), mine.str());
     for (const Manager each : {Manager::sfcb, Manager::openPegasus}) {
         as(each);
-        EXPECT_NE(told("Echo_Thread"), mine.str());
+        EXPECT_NE(reported("Echo_Thread"), mine.str());
     }
 }
 
 TEST_F(EmulationTest, AnUpCallRunsOnTheProvidersThreadOrOnAnother) {
     for (const Manager each : {Manager::standard, Manager::sfcb}) {
         as(each);
-        EXPECT_EQ(told("Echo_Calls"), "same thread");
+        EXPECT_EQ(reported("Echo_Calls"), "same thread");
     }
     as(Manager::openPegasus);
-    EXPECT_EQ(told("Echo_Calls"), "another thread");
+    EXPECT_EQ(reported("Echo_Calls"), "another thread");
 }
 
 TEST_F(EmulationTest, AFactoryMayMakeUpCallsThatStartProviders) {
@@ -371,9 +371,9 @@ TEST_F(EmulationTest, FactoriesAreCalledOnceAProviderOrOnceAClass) {
     for (const auto& [each, calls] :
          {std::pair(Manager::standard, 1U), std::pair(Manager::sfcb, 2U), std::pair(Manager::openPegasus, 1U)}) {
         as(each);
-        told("Echo_Broker");
-        told("ECHO_broker");
-        told("Echo_Seen");
+        reported("Echo_Broker");
+        reported("ECHO_broker");
+        reported("Echo_Seen");
         EXPECT_EQ(log.size(), calls);
     }
 }

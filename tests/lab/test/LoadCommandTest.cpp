@@ -11,7 +11,7 @@ using testing::AllOf;
 using testing::HasSubstr;
 
 /** Runs the program with the inventory's classes and their provider. */
-Ended runInventory(std::vector<std::string> arguments) {
+ProgramResult runInventory(std::vector<std::string> arguments) {
     arguments.insert(arguments.begin(), {"--schema", INVENTORY_DATA "/inventory.mof", "--registration",
                                          INVENTORY_DATA "/inventory.reg", "--library-path", INVENTORY_PROVIDERS});
     return runBare(arguments);
@@ -19,13 +19,13 @@ Ended runInventory(std::vector<std::string> arguments) {
 
 nlohmann::json reportOf(std::vector<std::string> arguments, int status) {
     arguments.insert(arguments.begin(), {"--format", "json"});
-    const Ended ended = runInventory(arguments);
+    const ProgramResult ended = runInventory(arguments);
     EXPECT_EQ(ended.status, status) << ended.error;
     return nlohmann::json::parse(ended.output);
 }
 
 TEST(LoadCommand, ReportsFiguresAndSucceedsWhenNoAnswerIsWrong) {
-    const Ended ended = runInventory({"load", "Inventory_Thing", "--clients", "4", "--requests", "400"});
+    const ProgramResult ended = runInventory({"load", "Inventory_Thing", "--clients", "4", "--requests", "400"});
     EXPECT_EQ(ended.status, 0);
     EXPECT_EQ(ended.error, "");
     EXPECT_THAT(ended.output,
@@ -35,7 +35,7 @@ TEST(LoadCommand, ReportsFiguresAndSucceedsWhenNoAnswerIsWrong) {
 }
 
 TEST(LoadCommand, DescribesWrongAnswersAndFails) {
-    const Ended ended = runInventory({"load", "Inventory_Liar", "--requests", "400", "--show", "1"});
+    const ProgramResult ended = runInventory({"load", "Inventory_Liar", "--requests", "400", "--show", "1"});
     EXPECT_EQ(ended.status, 1);
     EXPECT_THAT(ended.error, testing::MatchesRegex("cimhost-lab: [0-9]+ answers were wrong\n"));
     EXPECT_THAT(ended.output, AllOf(HasSubstr("wrong answers: "), HasSubstr(", value "),
@@ -94,7 +94,7 @@ TEST(LoadCommand, TakesClassesMixAndAssociations) {
 }
 
 TEST(LoadCommand, AFailureBeforeTheLoadIsAnError) {
-    const Ended ended = runInventory({"load", "root/nowhere:Inventory_Thing"});
+    const ProgramResult ended = runInventory({"load", "root/nowhere:Inventory_Thing"});
     EXPECT_EQ(ended.status, 1);
     EXPECT_THAT(ended.error, HasSubstr("CMPI_RC_ERR_INVALID_NAMESPACE"));
 }
@@ -114,10 +114,10 @@ TEST(LoadCommand, ReportsErrorsOfTheCommandLine) {
         {{"--raw", "load", "Inventory_Thing"}, "load sends many"},
         {{"--format", "mof", "load", "Inventory_Thing"}, "--format mof shows only instances"},
     };
-    for (const auto& [words, complaint] : lines) {
-        const Ended refused = runInventory(words);
-        EXPECT_EQ(refused.status, 2) << complaint;
-        EXPECT_THAT(refused.error, HasSubstr(complaint));
+    for (const auto& [words, message] : lines) {
+        const ProgramResult refused = runInventory(words);
+        EXPECT_EQ(refused.status, 2) << message;
+        EXPECT_THAT(refused.error, HasSubstr(message));
         EXPECT_EQ(refused.output, "");
     }
 }

@@ -3,7 +3,7 @@
 #include <gtest/gtest.h>
 
 #include "cim/DateTime.h"
-#include "schema/CimType.h"
+#include "model/Value.h"
 #include "schema/MofWriter.h"
 #include "support/Values.h"
 

@@ -1,9 +1,25 @@
 #pragma once
 
+#include "AssetIDDetails.h"
+
 #include <array>
 
-/** The keys of the asset data file that are read and written. */
+/** The asset data file: its name, its lock, and the keys that are read and written. */
 namespace KO::LeaseWarrantyProvider {
+
+constexpr const wchar_t* assetFileName = L"asset.dat";
+
+/** Scoped lock of the asset data file. */
+class FileLock {
+public:
+    FileLock() { _fileMutex.lock(withoutLimit); }
+    ~FileLock() { _fileMutex.unlock(); }
+    FileLock(const FileLock&) = delete;
+    FileLock& operator=(const FileLock&) = delete;
+
+private:
+    static constexpr unsigned long withoutLimit = 0xFFFFFFFF;
+};
 
 constexpr const char* USER_ASSET_NUMBER_KEY = "USER.AssetNumber";
 constexpr const char* USER_ASSET_ID_TAG_KEY = "USER.AssetIdTag";
