@@ -1,14 +1,15 @@
 #include "ProviderConnection.h"
 
+#include "durable/DataDirectory.h"
+
+#include "KO/PlatformUtilities.h"
+
 #include <dlfcn.h>
 
 #include <chrono>
+#include <cstdlib>
 #include <exception>
-
-extern "C" {
-CMPIInstanceMI* LeaseAndWarrantyProvider_Create_InstanceMI(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
-CMPIAssociationMI* LeaseAndWarrantyProvider_Create_AssociationMI(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
-}
+#include <thread>
 
 namespace gate {
 
@@ -20,10 +21,14 @@ namespace {
  */
 constexpr std::chrono::seconds drainTimeout{5};
 
-/** Destroyed before the provider's static objects, so that no request is running when these are destroyed. */
-const struct ShutdownAtExit {
-    ~ShutdownAtExit() { theRequestLock.close(drainTimeout, RequestLock::Closing::permanent); }
-} shutdownAtExit;
+/** How long a request waits for up-calls of the provider before that is loaded again. */
+constexpr std::chrono::seconds upCallTimeout{5};
+constexpr std::chrono::milliseconds pollInterval{10};
+
+/** Called when this library is unloaded and when the process ends. */
+void endAtExit() {
+    theRequestLock.close(drainTimeout, RequestLock::Closing::permanent, [] { theConnection.endProcess(); });
+}
 
 /** Keeps this library and its dependencies in the process, for a request that is still running in them. */
 void stayLoaded() {
@@ -32,6 +37,10 @@ void stayLoaded() {
         dlopen(self.dli_fname, RTLD_LAZY | RTLD_NOLOAD | RTLD_NODELETE);  // not closed, which would end its effect
     }
 }
+
+/** The agent's data directory. */
+durable::DataDirectory theDirectory{[] { return std::string(KO::PlatformUtilities::getKelsaDataDir()); },
+                                    [](const std::string& message) { logError(message); }};
 
 }  // namespace
 
@@ -47,15 +56,79 @@ void ProviderConnection::connect(const CMPIBroker* manager) {
         return;
     }
     const LockGuard guard;
-    wrapped.emplace(manager, WrappedBroker::Lock{[] { theRequestLock.release(); }, [] { theRequestLock.reacquire(); }});
-    CMPIStatus status{CMPI_RC_OK, nullptr};
-    instances = LeaseAndWarrantyProvider_Create_InstanceMI(wrapped->handle(), nullptr, &status);
-    associations = LeaseAndWarrantyProvider_Create_AssociationMI(wrapped->handle(), nullptr, &status);
-    const bool isConnected = instances != nullptr && associations != nullptr;
-    set(isConnected ? manager : nullptr);
-    if (!isConnected) {
+    wrapped.emplace(manager,
+                    WrappedBroker::Lock{[] { theConnection.beginUpCall(); }, [] { theConnection.endUpCall(); }});
+    try {
+        library.isLoaded() ? createInterfaces() : load();
+    } catch (...) {
+        set(nullptr);
+        throw;
+    }
+    set(manager);
+}
+
+void ProviderConnection::requireOwnedDirectory() {
+    theDirectory.requireOwned();
+}
+
+bool ProviderConnection::needsLoading() const {
+    return isOutdated || !library.isLoaded() || theDirectory.isOutdated();
+}
+
+void ProviderConnection::requireCurrent(LockGuard& guard) {
+    const auto end = std::chrono::steady_clock::now() + upCallTimeout;
+    while (needsLoading() && upCalls != 0 && std::chrono::steady_clock::now() < end) {
+        guard.releaseFor([] { std::this_thread::sleep_for(pollInterval); });
+    }
+    if (needsLoading()) {
+        if (upCalls != 0) {
+            fail(CMPI_RC_ERR_FAILED,
+                 "The provider waits for the object manager and cannot be loaded again. Try again.");
+        }
+        load();
+    }
+}
+
+/** Loads the provider, which reads its files. Unloads it first if it is loaded. */
+void ProviderConnection::load() {
+    constexpr int attempts = 10;
+    isOutdated = true;
+    for (int attempt = 0; attempt == 0 || (theDirectory.hasChanged() && attempt < attempts); ++attempt) {
+        theDirectory.open();
+        unload();
+        library.load();
+    }
+    // Registered after the provider's static objects, so that no request is running when these are destroyed.
+    std::atexit(endAtExit);
+    createInterfaces();
+    isOutdated = false;
+    verified = 0;
+}
+
+void ProviderConnection::unload() {
+    instances = nullptr;
+    associations = nullptr;
+    if (library.isLoaded() && !library.unload()) {
+        logError("The provider is also loaded without the gate, so it cannot read its files again. Register only one.");
+    }
+}
+
+void ProviderConnection::createInterfaces() {
+    instances = library.createInstanceMI(wrapped->handle());
+    associations = library.createAssociationMI(wrapped->handle());
+    if (instances == nullptr || associations == nullptr) {
         fail(CMPI_RC_ERR_FAILED, "The provider did not return its interfaces.");
     }
+}
+
+void ProviderConnection::beginUpCall() {
+    ++upCalls;
+    theRequestLock.release();
+}
+
+void ProviderConnection::endUpCall() {
+    theRequestLock.reacquire();
+    --upCalls;
 }
 
 const CMPIBroker* ProviderConnection::broker() const {
@@ -93,11 +166,19 @@ void ProviderConnection::set(const CMPIBroker* manager) {
 }
 
 void ProviderConnection::endProvider(const CMPIContext* context) {
-    if (broker() != nullptr) {
+    if (broker() != nullptr && instances != nullptr && associations != nullptr) {
         instances->ft->cleanup(instances, context, 1);
         associations->ft->cleanup(associations, context, 1);
     }
     set(nullptr);
+    endProcess();
+}
+
+void ProviderConnection::endProcess() {
+    if (upCalls == 0) {
+        unload();
+        theDirectory.close();
+    }
 }
 
 }  // namespace gate

@@ -86,6 +86,7 @@ void Request::give(const std::vector<const CMPIObjectPath*>& paths) const {
 
 ProviderSession::ProviderSession(const Request& itsRequest) : request(itsRequest) {
     request.broker();  // there must be one
+    theConnection.requireCurrent(guard);
 }
 
 ProviderSession::Paths ProviderSession::names(const LocalObjectPath& classPath) const {

@@ -1,0 +1,37 @@
+#pragma once
+
+#include <optional>
+#include <string>
+#include <string_view>
+
+// Files that survive the end of the process and of the machine. All functions throw std::system_error, whose what()
+// is the path and the reason.
+
+namespace durable {
+
+/** Reads a file. None if it does not exist. */
+std::optional<std::string> readFile(const std::string& path);
+
+/**
+ * Replaces a file, or creates it. It has the old or the new content at any time, and the new one is on the disk when
+ * the function returns; its name is, after syncDirectoryOf().
+ * @param model the file whose mode, owner and group the new one gets, if it exists; otherwise only the owner has access
+ */
+void replaceFile(const std::string& path, std::string_view content, const std::string& model);
+
+/** Creates an empty file, unless it exists. Its name is on the disk after syncDirectoryOf(). */
+void createFile(const std::string& path);
+
+/** Renames a file. The new name is on the disk after syncDirectoryOf(). */
+void renameFile(const std::string& from, const std::string& to);
+
+/** Removes a file, if it exists. */
+void removeFile(const std::string& path);
+
+/** Writes the data of a file to the disk. */
+void syncFile(const std::string& path);
+
+/** Writes the names in the directory of a file to the disk. */
+void syncDirectoryOf(const std::string& path);
+
+}  // namespace durable

@@ -1,0 +1,58 @@
+#include "ProviderLibrary.h"
+
+#include <dlfcn.h>
+
+#include <stdexcept>
+#include <string>
+
+namespace gate {
+
+namespace {
+
+constexpr const char* libraryName = "libLeaseAndWarrantyProvider.so";
+
+/** The provider's file: in the directory of the file that contains this function. */
+std::string libraryPath() {
+    Dl_info self{};
+    const bool isKnown = dladdr(reinterpret_cast<const void*>(&libraryPath), &self) != 0 && self.dli_fname != nullptr;
+    const std::string file = isKnown ? self.dli_fname : "";
+    return file.substr(0, file.rfind('/') + 1) + libraryName;
+}
+
+template <class Interface>
+Interface* callFactory(void* library, const char* name, const CMPIBroker* broker) {
+    using Factory = Interface*(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
+    auto* factory = reinterpret_cast<Factory*>(dlsym(library, name));
+    CMPIStatus status{CMPI_RC_OK, nullptr};
+    return factory == nullptr ? nullptr : factory(broker, nullptr, &status);
+}
+
+}  // namespace
+
+void ProviderLibrary::load() {
+    handle = dlopen(libraryPath().c_str(), RTLD_NOW | RTLD_LOCAL);
+    if (handle == nullptr) {
+        const char* reason = dlerror();
+        throw std::runtime_error(std::string("The provider cannot be loaded: ") + (reason == nullptr ? "" : reason));
+    }
+}
+
+bool ProviderLibrary::unload() {
+    dlclose(handle);
+    handle = nullptr;
+    void* const other = dlopen(libraryPath().c_str(), RTLD_NOW | RTLD_NOLOAD);
+    if (other != nullptr) {
+        dlclose(other);
+    }
+    return other == nullptr;
+}
+
+CMPIInstanceMI* ProviderLibrary::createInstanceMI(const CMPIBroker* broker) const {
+    return callFactory<CMPIInstanceMI>(handle, "LeaseAndWarrantyProvider_Create_InstanceMI", broker);
+}
+
+CMPIAssociationMI* ProviderLibrary::createAssociationMI(const CMPIBroker* broker) const {
+    return callFactory<CMPIAssociationMI>(handle, "LeaseAndWarrantyProvider_Create_AssociationMI", broker);
+}
+
+}  // namespace gate

@@ -1,0 +1,31 @@
+#pragma once
+
+#include <cmpift.h>
+
+namespace gate {
+
+/**
+ * The provider's shared library, in the directory of this one. It is not linked: the provider reads its record files
+ * when it is loaded, so they have to be recovered before. Loaded again, it reads them again.
+ */
+class ProviderLibrary {
+public:
+    bool isLoaded() const { return handle != nullptr; }
+
+    /** Loads the library. Throws std::runtime_error with the reason. */
+    void load();
+
+    /** Unloads it. False if it stays in the process, since another part of that has loaded it, too. */
+    bool unload();
+
+    /** @name The factories, while it is loaded. Null if the provider returns no interface. */
+    ///@{
+    CMPIInstanceMI* createInstanceMI(const CMPIBroker* broker) const;
+    CMPIAssociationMI* createAssociationMI(const CMPIBroker* broker) const;
+    ///@}
+
+private:
+    void* handle = nullptr;
+};
+
+}  // namespace gate
