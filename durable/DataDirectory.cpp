@@ -12,8 +12,9 @@ namespace durable {
 
 namespace {
 
-/** How long a change waits for another owner, and a start for complete files. */
+/** Maximum time that a change waits for another owner to end. */
 constexpr std::chrono::seconds ownerTimeout{5};
+/** Maximum time that open() waits for another owner to finish writing. */
 constexpr std::chrono::seconds writeTimeout{1};
 constexpr std::chrono::milliseconds pollInterval{20};
 
@@ -60,6 +61,7 @@ bool DataDirectory::acquire(std::string& owner) {
         log("The data directory cannot be locked, so do not let two processes change it. " + result.reason);
     }
     isOwned = !isOther;
+    hadOther = hadOther || isOther;
     owner = result.reason;
     return !isOther;
 }
@@ -101,14 +103,12 @@ bool DataDirectory::isOutdated() const {
 
 DataDirectory::Stamp DataDirectory::stamp() const {
     Stamp stamp{};
-    auto* next = stamp.begin();
-    for (const RecordFile& file : recordFilesIn(path())) {
+    const std::vector<RecordFile> files = recordFilesIn(path());
+    for (std::size_t index = 0; index < stamp.size(); ++index) {
         struct stat status {};
-        stat(file.path().c_str(), &status);
-        *next++ = static_cast<long long>(status.st_ino);
-        *next++ = status.st_size;
-        *next++ = status.st_mtim.tv_sec;
-        *next++ = status.st_mtim.tv_nsec;
+        stat(files[index].path().c_str(), &status);
+        stamp[index] = {static_cast<long long>(status.st_ino), status.st_size, status.st_mtim.tv_sec,
+                        status.st_mtim.tv_nsec};
     }
     return stamp;
 }

@@ -23,17 +23,17 @@ public:
         : path(itsPath), log(itsLog) {}
 
     /**
-     * Called before the provider is loaded. The owner recovers the record files. Another process waits until they are
-     * complete, but not for long. Throws std::system_error if a file cannot be checked or restored.
+     * Called before the provider is loaded. The owner recovers the record files. Another process waits at most a second
+     * until they are complete. Throws std::system_error if a file cannot be checked or restored.
      */
     void open();
 
-    /** Gives up the lock. Called when the provider is unloaded. */
+    /** Releases the lock. Called when the provider is unloaded. */
     void close() { lock.release(); }
 
     /**
-     * Waits some seconds for an owner that is ending. Throws std::runtime_error with the owner's process if it does
-     * not end.
+     * Ensures that this process is the owner. Waits some seconds for another owner to end, then throws
+     * std::runtime_error, which names it.
      */
     void requireOwned();
 
@@ -45,7 +45,7 @@ public:
 
 private:
     /** The inodes, sizes and times of the record files. */
-    using Stamp = std::array<long long, 8>;
+    using Stamp = std::array<std::array<long long, 4>, recordFileCount>;
 
     bool acquire(std::string& owner);
     void recover() const;
@@ -57,7 +57,7 @@ private:
     DirectoryLock lock{};
     std::atomic<bool> isOwned{false};
     std::atomic<bool> isReported{false};
-    bool hadOther = false;  ///< whether another process was the owner at open()
+    std::atomic<bool> hadOther{false};  ///< whether another process was the owner at open() or since
     Stamp openStamp{};
 };
 

@@ -30,7 +30,7 @@ DirectoryLock::Result DirectoryLock::acquire(const std::string& directory) {
     if (isHeldIn(path)) {
         return {State::held};
     }
-    closeFile();  // of the parent process, or in a directory that was replaced
+    closeFile();  // inherited from the parent process, or removed from the directory
     descriptor = open(path.c_str(), O_RDWR | O_CREAT | O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK, 0644);
     struct flock lock = lockOfFile();
     if (descriptor >= 0 && fcntl(descriptor, F_SETLK, &lock) == 0) {
@@ -46,7 +46,7 @@ DirectoryLock::Result DirectoryLock::acquire(const std::string& directory) {
     return result;
 }
 
-/** Whether this process holds the lock, and of the file that is there now. */
+/** Whether this process holds the lock of the file that now has this path. */
 bool DirectoryLock::isHeldIn(const std::string& path) const {
     struct stat held {};
     struct stat found {};
@@ -73,7 +73,8 @@ void DirectoryLock::writeOwner() const {
     static_cast<void>(isWritten);  // the lock holds without it
 }
 
-/** The system knows the owner's id, except in another container; the file has its program, too. */
+/** The process id is from the system or, for an owner in another container, from the file; the name is from the file.
+ */
 std::string DirectoryLock::ownerOf(const std::string& path) const {
     struct flock lock = lockOfFile();
     const bool isKnown = fcntl(descriptor, F_GETLK, &lock) == 0 && lock.l_type != F_UNLCK && lock.l_pid > 0;

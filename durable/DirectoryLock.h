@@ -9,10 +9,10 @@ namespace durable {
 
 /**
  * The lock by which one process owns a data directory: an advisory record lock on the file "owner" there. The file's
- * content, the process id and the program, is only for people.
+ * content, the process id and the program, is only for messages.
  *
- * A record lock belongs to the process: it ends with it, a forked child does not have it, and the system names its
- * owner. It ends, too, if the process closes the file anywhere, so nothing else may open it.
+ * A record lock belongs to the process: it ends with the process, a forked child does not have it, and the system knows
+ * its owner. The process also loses it if it closes any descriptor of the file, so no other code may open the file.
  */
 class DirectoryLock {
 public:
@@ -29,8 +29,8 @@ public:
 
     constexpr DirectoryLock() = default;
     ~DirectoryLock() {
-        closeFile();
-    }  // without the mutex, which another thread may have held when this process was forked
+        closeFile();  // without the mutex, which another thread may have held when this process was forked
+    }
     DirectoryLock(const DirectoryLock&) = delete;
     DirectoryLock& operator=(const DirectoryLock&) = delete;
 
@@ -47,7 +47,7 @@ private:
 
     std::mutex mutex{};
     int descriptor = -1;
-    pid_t process = 0;  ///< that acquired it; a forked child has the descriptor but not the lock
+    pid_t process = 0;  ///< the process that acquired it; a forked child has the descriptor but not the lock
 };
 
 }  // namespace durable

@@ -22,7 +22,7 @@ void require(bool isDone, const std::string& path) {
     }
 }
 
-/** An open file, which is closed at the end of its scope. */
+/** A file that is open during the lifetime of this object. */
 class Descriptor {
 public:
     Descriptor(const std::string& itsPath, int flags, mode_t mode = 0)
@@ -67,7 +67,7 @@ public:
         }
     }
 
-    /** Without the right to change the owner, the mode is that of the model without the rights of others. */
+    /** Copies owner, group and mode. If the owner cannot be copied, only the new owner has access. */
     void beLike(const std::string& model) const {
         struct stat found {};
         if (stat(model.c_str(), &found) == 0) {

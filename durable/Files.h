@@ -4,8 +4,8 @@
 #include <string>
 #include <string_view>
 
-// Files that survive the end of the process and of the machine. All functions throw std::system_error, whose what()
-// is the path and the reason.
+// Files that survive a killed process and a power failure. All functions throw std::system_error, whose what() is the
+// path and the reason.
 
 namespace durable {
 
@@ -13,8 +13,8 @@ namespace durable {
 std::optional<std::string> readFile(const std::string& path);
 
 /**
- * Replaces a file, or creates it. It has the old or the new content at any time, and the new one is on the disk when
- * the function returns; its name is, after syncDirectoryOf().
+ * Replaces or creates a file. At any time, it has the old or the new content. The new content is on the disk when the
+ * function returns, and has the file's name after syncDirectoryOf().
  * @param model the file whose mode, owner and group the new one gets, if it exists; otherwise only the owner has access
  */
 void replaceFile(const std::string& path, std::string_view content, const std::string& model);

@@ -21,7 +21,7 @@ namespace {
 constexpr struct {
     const char* fileName;
     std::size_t linesPerRecord;
-} formats[] = {{"Lease.dat", 13}, {"Warranty.dat", 4}};
+} formats[recordFileCount] = {{"Lease.dat", 13}, {"Warranty.dat", 4}};
 
 /** The content without the white space at its beginning, which the provider skips. */
 std::string_view withoutLeadingSpace(std::string_view content) {
@@ -127,8 +127,8 @@ void RecordFile::restore(const std::string& before) const {
 }
 
 /**
- * Makes the saved copy the record file: that needs no space. The next change makes another copy first. What follows the
- * renaming waits until that is on the disk, since without it the copy is needed as it is.
+ * Renames the saved copy to the record file, which needs no disk space. The next change makes another copy first. The
+ * directory is synced before the file is shortened: until the new name is on the disk, the copy must stay complete.
  */
 void RecordFile::useSaved(std::size_t size) const {
     renameFile(saved, file);

@@ -14,9 +14,9 @@ namespace durable {
  *
  * | File | Content |
  * |---|---|
- * | NAME.saved | the records of the last change that was answered, and a line with the file's name; always complete |
- * | NAME.unfinished | empty; exists while complete states of NAME are not those of an answered change |
- * | NAME.damaged | what recover() found in NAME and replaced |
+ * | NAME.saved | the records after the last answered change, and a line with the file's name; always complete |
+ * | NAME.unfinished | empty; exists during a change that writes NAME more than once |
+ * | NAME.damaged | the last content of NAME that recover() replaced or could not restore |
  *
  * A change is prepare(), the provider's writing, and commit() or restore(). Functions throw std::system_error if a file
  * cannot be read or written. Only the owner of the directory may call those that write.
@@ -41,13 +41,13 @@ public:
     bool isComplete(std::string_view content) const;
 
     /**
-     * Ensures that the saved copy has the current records. For a file that is not complete, those are the records of
-     * the copy that exists; a missing or empty file has none.
+     * Ensures that the saved copy has the current records: those of the file or, if that is incomplete, of the existing
+     * copy. A missing or empty file without a copy has none.
      * @return what restore() needs; empty for an incomplete file without a copy
      */
     std::string prepare() const;
 
-    /** Marks a change that writes the file more than once, so that no state between is taken for the last one. */
+    /** Marks a change that writes the file more than once, so that recover() discards its intermediate states. */
     void markUnfinished() const;
 
     /**
@@ -56,7 +56,7 @@ public:
      */
     void commit(std::string_view written) const;
 
-    /** Makes the file what it was before a change. @param before the result of prepare(), not empty */
+    /** Restores the file after a change. @param before the result of prepare(), not empty */
     void restore(const std::string& before) const;
 
     /** Whether the file is incomplete or unfinished, and recover() can restore it. */
@@ -64,8 +64,8 @@ public:
 
     /**
      * Restores an incomplete or unfinished file from the saved copy. Without a saved copy, keeps a copy of it.
-     * Call it before the provider is loaded, which reads its files then.
-     * @return what was wrong and what was done, for the log; empty if nothing was wrong
+     * Call it before the provider is loaded and reads its files.
+     * @return a message for the log; empty if the file was complete
      */
     std::string recover() const;
 
@@ -80,9 +80,12 @@ private:
     std::string saved;
     std::string unfinished;
     std::string damaged;
-    std::string lastLine;  ///< of the saved copy, which shows whose it is and that it is complete
+    std::string lastLine;  ///< of the saved copy; shows that it is complete and which file it copies
     std::size_t lines;     ///< per record
 };
+
+/** The number of record files in a data directory. */
+constexpr std::size_t recordFileCount = 2;
 
 /** The record files of a data directory, whose name ends with a separator. */
 std::vector<RecordFile> recordFilesIn(const std::string& directory);

@@ -95,7 +95,11 @@ void ProviderConnection::load() {
     isOutdated = true;
     for (int attempt = 0; attempt == 0 || (theDirectory.hasChanged() && attempt < attempts); ++attempt) {
         theDirectory.open();
-        unload();
+        if (!unload()) {
+            logError(
+                "The provider is also loaded without the gate, so it cannot read its files again. "
+                "Register only one.");
+        }
         library.load();
     }
     // Registered after the provider's static objects, so that no request is running when these are destroyed.
@@ -105,12 +109,11 @@ void ProviderConnection::load() {
     verified = 0;
 }
 
-void ProviderConnection::unload() {
+/** Unloads the provider if it is loaded. Returns false if it stays in the process. */
+bool ProviderConnection::unload() {
     instances = nullptr;
     associations = nullptr;
-    if (library.isLoaded() && !library.unload()) {
-        logError("The provider is also loaded without the gate, so it cannot read its files again. Register only one.");
-    }
+    return !library.isLoaded() || library.unload();
 }
 
 void ProviderConnection::createInterfaces() {

@@ -47,7 +47,7 @@ public:
     CMPIInstanceMI* instanceInterface() const { return instances; }
     CMPIAssociationMI* associationInterface() const { return associations; }
 
-    /** Says that the provider's tables are not those of its files, so that requireCurrent() loads it again. */
+    /** Marks the provider's tables as different from its files, so that requireCurrent() loads it again. */
     void setOutdated() { isOutdated = true; }
 
     /**
@@ -66,7 +66,7 @@ private:
 
     bool needsLoading() const;
     void load();
-    void unload();
+    bool unload();
     void createInterfaces();
     void beginUpCall();
     void endUpCall();

@@ -6,7 +6,7 @@ namespace gate {
 
 /**
  * The provider's shared library, in the directory of this one. It is not linked: the provider reads its record files
- * when it is loaded, so they have to be recovered before. Loaded again, it reads them again.
+ * when it is loaded, so they must be recovered first. If it is loaded again, it reads them again.
  */
 class ProviderLibrary {
 public:
@@ -15,7 +15,7 @@ public:
     /** Loads the library. Throws std::runtime_error with the reason. */
     void load();
 
-    /** Unloads it. False if it stays in the process, since another part of that has loaded it, too. */
+    /** Unloads it. Returns false if it stays in the process, because another part of the process has loaded it. */
     bool unload();
 
     /** @name The factories, while it is loaded. Null if the provider returns no interface. */

@@ -78,7 +78,7 @@ public:
     void modify(const LocalObjectPath& path, const Values& values);
     void remove(const LocalObjectPath& path);
 
-    /** Says that the provider's tables are wrong. It is loaded again before the next request. */
+    /** Marks the provider's tables as wrong: it is loaded again before the next request. */
     void setOutdated() const { theConnection.setOutdated(); }
 
     /** Releases the lock for a call of the object manager that may take long or lead back to the gate. */
