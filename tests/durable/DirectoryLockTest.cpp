@@ -44,7 +44,7 @@ protected:
     DirectoryLock held;
 };
 
-TEST_F(DirectoryLockTest, OnlyOneProcessHoldsIt) {
+TEST_F(DirectoryLockTest, IsHeldByOneProcess) {
     EXPECT_EQ(held.acquire(path).state, State::held);
     EXPECT_EQ(held.acquire(path).state, State::held) << "again";
     EXPECT_EQ(stateInChild(), State::heldByOther);
@@ -114,7 +114,7 @@ TEST_F(DirectoryLockTest, FollowsADirectoryThatIsReplaced) {
     EXPECT_EQ(stateInChild(), State::heldByOther);
 }
 
-TEST_F(DirectoryLockTest, SaysWhyItIsUnavailable) {
+TEST_F(DirectoryLockTest, ReportsWhyItIsUnavailable) {
     const DirectoryLock::Result result = held.acquire("/nonexistent/directory/");
     EXPECT_EQ(result.state, State::unavailable);
     EXPECT_THAT(result.reason, HasSubstr("No such file or directory"));

@@ -1,14 +1,14 @@
-// Kills processes in which 8 clients create, modify and delete leases through the gate, and checks what is left.
+// Kills processes in which 8 clients create, modify and delete leases through the gate, and checks the leases.
 //
 // Usage: gate_kill_run KILLS [SEED]
 //
 // Exits with status 1 if an acknowledged change is lost, a refused or unanswered one is there in part, or a record
 // appears twice or was created by no client.
 
-#include <sys/mman.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <array>
 #include <chrono>
 #include <csignal>
@@ -20,6 +20,7 @@
 #include <thread>
 
 #include "ManagedGate.h"
+#include "SharedMemory.h"
 #include "lab/emulation/ManagerEmulation.h"
 #include "support/AgentEnvironment.h"
 
@@ -54,7 +55,7 @@ std::string lessorOf(int value) {
     return "lessor of change " + std::to_string(value);
 }
 
-/** One of the clients. Each works on its own leases, so it knows what has to be there. */
+/** A client. Each changes its own leases only, so it knows the expected ones. */
 class Client {
 public:
     Client(ManagedGate& itsGate, Knowledge& itsKnowledge, int itsNumber, unsigned int seed)
@@ -124,13 +125,13 @@ void serve(Knowledge& knowledge, unsigned int seed) {
     }
 }
 
-/** The value of a lease; -1 if it is there in part. */
+/** Returns the value of a lease; -1 if it is there in part. */
 int valueOf(const Instance& instance) {
     const int value = std::atoi(valueIn(instance, "LeaseTerm").value_or("0").c_str());
     return value > 0 && valueIn(instance, "Lessor") == lessorOf(value) ? value : -1;
 }
 
-/** Compares the leases with what the clients know, and stores what is there as known. Returns the number of errors. */
+/** Compares the leases with the knowledge of the clients, then updates it. Returns the number of errors. */
 int check(Knowledge& knowledge) {
     ManagedGate gate(cimhost::lab::Manager::standard);
     const auto response = gate.manager().perform(cimhost::Request::enumerateInstances(classPath(lease)));
@@ -205,11 +206,7 @@ bool killClients(Knowledge& knowledge, std::mt19937& random) {
 }
 
 int run(int kills, unsigned int seed) {
-    void* memory = mmap(nullptr, sizeof(Knowledge), PROT_READ | PROT_WRITE, MAP_SHARED | MAP_ANONYMOUS, -1, 0);
-    if (memory == MAP_FAILED) {
-        throw std::runtime_error("no shared memory");
-    }
-    Knowledge& knowledge = *static_cast<Knowledge*>(memory);
+    auto& knowledge = sharedMemory<Knowledge>();
     std::mt19937 random(seed);
     int errors = 0;
     int answered = 0;
@@ -225,7 +222,7 @@ int run(int kills, unsigned int seed) {
         int status = 0;
         waitpid(checker, &status, 0);
         if (!WIFEXITED(status) || WEXITSTATUS(status) != 0) {
-            std::cout << "kill " << kill << ": what is left is wrong\n";
+            std::cout << "kill " << kill << ": the leases are wrong\n";
             ++errors;
         }
     }

@@ -45,7 +45,7 @@ TEST_F(LibraryTest, LoadsTheProviderFromItsOwnDirectory) {
     EXPECT_TRUE(isLoaded(testsupport::underTest(PROVIDER_LIBRARY)));
 }
 
-TEST_F(LibraryTest, SaysThatTheProviderIsMissing) {
+TEST_F(LibraryTest, ReportsAMissingProvider) {
     namespace fs = std::filesystem;
     const testsupport::TempDirectory others;
     const fs::path built = gateFile();

@@ -15,9 +15,9 @@
 #include <map>
 #include <set>
 
-// Power failures during changes. The operations on files are recorded, and for each moment every state is built that a
-// file system may have then: of what was not synced, names and data may be there or not. Names may change in any order;
-// of a file's data any first part may be there, or all with one part as zeros.
+// Power failures during changes. Records the operations on files, and at each of them builds every state that a file
+// system may have after a power failure. Of the names that were not synced, any subset may have changed. Of the writes
+// that were not synced, any first part may be there, or all with one of them as zeros.
 
 extern const bool agentHasNoLog = true;
 
@@ -39,7 +39,7 @@ struct Event {
     std::size_t size = 0;  ///< after a truncation
 };
 
-/** Records operations while it lives. */
+/** Records operations during its lifetime. */
 struct Recording {
     static inline std::vector<Event>* events = nullptr;
 
@@ -51,7 +51,7 @@ struct Recording {
     std::vector<Event> recorded;
 };
 
-/** The name of a file if it is in the data directory, "/" for that itself; otherwise empty. */
+/** Returns the name of a file in the data directory, "/" for the directory itself, otherwise an empty string. */
 std::string nameOf(const std::string& path) {
     const fs::path directory = agentEnvironment::dataDirectory();
     const fs::path file = fs::path(path).lexically_normal();
@@ -107,7 +107,7 @@ void recordWriting(int descriptor, std::string data) {
     }
 }
 
-/** A file's data: what is synced, and the writing since. */
+/** A file's data: the synced content, and the operations since. */
 struct Data {
     std::string synced{};
     std::vector<Event> pending{};
@@ -221,7 +221,7 @@ private:
 
 class PowerCutTest : public GateTest {
 protected:
-    /** The lease file that the gate makes of a state of the directory when it is loaded. */
+    /** Returns the lease file after the recovery of a state of the directory. */
     const std::string& recovered(const Files& files) {
         const auto known = results.find(files);
         if (known != results.end()) {
@@ -242,7 +242,7 @@ protected:
         return results[files] = content;
     }
 
-    /** Makes a change, and cuts the power before and after each of its operations. */
+    /** Makes a change, and simulates a power failure before and after each of its operations. */
     void change(const std::function<void()>& request) {
         gate().instanceMI();
         Disk disk;
@@ -294,7 +294,7 @@ TEST_F(PowerCutTest, LeavesTheStateBeforeARefusedChange) {
 }  // namespace
 }  // namespace gatetest
 
-// Instead of the system's, also for the libraries under test.
+// Replace the C library's functions, also for the libraries under test.
 
 namespace {
 
@@ -380,7 +380,7 @@ VISIBLE int fsync(int file) {
     if (isRecorded(name)) {
         record({name == "/" ? Kind::syncNames : Kind::sync, inodeOf(file)});
     }
-    return 0;  // which is recorded, and slow
+    return 0;  // a real sync would only be slow
 }
 
 VISIBLE int rename(const char* from, const char* to) noexcept {

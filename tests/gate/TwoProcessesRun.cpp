@@ -5,16 +5,16 @@
 //
 // Exits with status 1 if an acknowledged change is lost, or a change is refused for another reason than the owner.
 
-#include <sys/mman.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <array>
 #include <cstdlib>
 #include <iostream>
-#include <stdexcept>
 
 #include "ManagedGate.h"
+#include "SharedMemory.h"
 #include "lab/emulation/ManagerEmulation.h"
 #include "support/AgentEnvironment.h"
 
@@ -29,7 +29,7 @@ constexpr int changesPerOwner = 100;
 /** Responses to a process. */
 struct Result {
     std::array<int, leases> acknowledged;  ///< the last change of each lease
-    int refused;                           ///< since the other process was the owner
+    int refused;                           ///< because the other process was the owner
     int wrong;
 };
 
@@ -69,7 +69,7 @@ void work(int process, int changes, Result& result) {
     }
 }
 
-/** Compares the leases with what the processes were answered. Returns the number of differences. */
+/** Compares the leases with the responses to the processes. Returns the number of differences. */
 int check(const Results& results) {
     ManagedGate gate(cimhost::lab::Manager::standard);
     int wrong = gate.paths(lease).size() == 2 * leases ? 0 : 1;
@@ -89,11 +89,7 @@ int check(const Results& results) {
 }
 
 int run(int changes) {
-    void* memory = mmap(nullptr, sizeof(Results), PROT_READ | PROT_WRITE, MAP_SHARED | MAP_ANONYMOUS, -1, 0);
-    if (memory == MAP_FAILED) {
-        throw std::runtime_error("no shared memory");
-    }
-    Results& results = *static_cast<Results*>(memory);
+    auto& results = sharedMemory<Results>();
     for (int process = 0; process < 2; ++process) {
         if (fork() == 0) {
             work(process, changes, results[static_cast<std::size_t>(process)]);

@@ -16,7 +16,7 @@ namespace {
 using testing::ElementsAre;
 using testing::HasSubstr;
 
-/** Another process, which does one of its tasks whenever it is asked. */
+/** Another process, which runs its tasks on request. */
 class OtherProcess {
 public:
     explicit OtherProcess(std::vector<std::function<bool()>> tasks) {
@@ -40,7 +40,7 @@ public:
     OtherProcess(const OtherProcess&) = delete;
     OtherProcess& operator=(const OtherProcess&) = delete;
 
-    /** Asks for a task, and returns its result. */
+    /** Runs a task and returns its result. */
     bool does(int number) {
         const char task = static_cast<char>(number);
         char isRight = 0;
@@ -76,7 +76,7 @@ TEST_F(TwoProcessesTest, OneReadsWhatTheOtherStores) {
     EXPECT_EQ(valueIn(instanceOf("L1"), "LeaseTerm"), "2");
 }
 
-TEST_F(TwoProcessesTest, AChangeIsRefusedWithTheNameOfTheOwnerAndMadeWhenThatHasEnded) {
+TEST_F(TwoProcessesTest, AChangeIsRefusedWithTheNameOfTheOwnerUntilItEnds) {
     OtherProcess owner({[&] { return create("L1").rc == CMPI_RC_OK; }, [&] { return create("L2").rc == CMPI_RC_OK; }});
     ASSERT_TRUE(owner.does(0));
     const Outcome refused = create("L3");
@@ -88,6 +88,18 @@ TEST_F(TwoProcessesTest, AChangeIsRefusedWithTheNameOfTheOwnerAndMadeWhenThatHas
     EXPECT_THAT(identifiers(), ElementsAre("L1", "L2", "L4"));
     unload();
     EXPECT_THAT(identifiers(), ElementsAre("L1", "L2", "L4"));
+}
+
+TEST_F(TwoProcessesTest, AnOwnerThatLosesTheLockReadsTheFilesAgain) {
+    OtherProcess other({[&] { return create("L2").rc == CMPI_RC_OK; }});
+    create("L1");
+    std::filesystem::remove(dataFile("owner"));
+    ASSERT_TRUE(other.does(0));
+    EXPECT_THAT(create("L3"), isRefused(CMPI_RC_ERR_FAILED, "is in use by process"));
+    EXPECT_THAT(identifiers(), ElementsAre("L1", "L2"));
+    other.end();
+    EXPECT_THAT(create("L3"), isAnswered(1));
+    EXPECT_THAT(identifiers(), ElementsAre("L1", "L2", "L3"));
 }
 
 TEST_F(TwoProcessesTest, TheFileOfAnEarlierOwnerLocksNothing) {

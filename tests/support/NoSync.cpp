@@ -1,7 +1,7 @@
 #include <unistd.h>
 
-// Syncs do nothing in a program that contains this file, also in the libraries under test: they are slow on a busy
-// disk, and PowerCutTest tests their purpose.
+// Replaces fsync by a function without effect, also for the libraries under test: a sync is slow on a busy disk, and
+// PowerCutTest tests its purpose.
 
 extern "C" __attribute__((visibility("default"))) int fsync(int) {
     return 0;
