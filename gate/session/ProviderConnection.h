@@ -51,8 +51,8 @@ public:
     void setOutdated() { isOutdated = true; }
 
     /**
-     * Loads the provider if it is not loaded or outdated. It cannot be unloaded while another request is in an up-call
-     * of it, so the lock is released until that returns. Fails with CMPI_RC_ERR_FAILED if it does not return soon.
+     * Loads the provider if it is not loaded or outdated. Releases the lock until no other request is in an up-call of
+     * the provider, since it cannot be unloaded before. Fails with CMPI_RC_ERR_FAILED if that takes too long.
      */
     void requireCurrent(LockGuard& guard);
 

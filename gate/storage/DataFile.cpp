@@ -46,8 +46,11 @@ std::string reasonOf(int error) {
 /** Fails if the file exists and cannot be written or is not a regular file. */
 void requireWritableFile(const std::string& path) {
     const int descriptor = open(path.c_str(), O_RDWR | O_CLOEXEC | O_NONBLOCK);
+    if (descriptor < 0 && errno == ENOENT) {
+        return;
+    }
     if (descriptor < 0) {
-        return errno == ENOENT ? void() : failToStore(path, reasonOf(errno));
+        failToStore(path, reasonOf(errno));
     }
     struct stat status {};
     const bool isRegular = fstat(descriptor, &status) == 0 && S_ISREG(status.st_mode);
@@ -69,7 +72,7 @@ bool hasRoom(const std::string& directory, std::size_t growth) {
     return blocks > (growth + block) / system.f_frsize;
 }
 
-/** Calls a function on files. */
+/** Calls a function, and reports the errors of files to the client. */
 template <class Work>
 auto onFiles(Work work) {
     try {
@@ -162,7 +165,7 @@ void DataFile::rollBack(const FileState& before) const {
         if (hasRecords) {
             recordFileOf(*this).restore(before.restorable);
         } else if (!(state() == before)) {
-            const std::string path = std::filesystem::canonical(pathOf(*this));  // it may be a link
+            const std::string path = std::filesystem::canonical(pathOf(*this));  // replaces the target of a link
             durable::replaceFile(path, before.content, path);
             durable::syncDirectoryOf(path);
         }

@@ -37,22 +37,21 @@ struct DataFile {
 
     FileState state() const;
 
-    /** Whether a provider with that many records has read the record file, after its recovery. */
-    bool isReadAs(std::size_t count) const;
+    /** Whether the record file needs no recovery and has this number of records. */
+    bool hasCount(std::size_t count) const;
 
     /** Fails if a line of the record file is not the identifier. */
     void requireRecord(const std::string& identifier) const;
 
-    /** @name A change, between these functions */
+    /** @name Storing a change: begin(), the provider's writing, then commit() or rollBack() */
     ///@{
-
-    /** Returns the state before the change, for rollBack(). @param hasSteps whether it writes the file repeatedly */
+    /** Returns the state before the change. @param hasSteps whether the change writes the file more than once */
     FileState begin(bool hasSteps) const;
 
-    /** Fails unless the file has been written since this state and is on the disk, so that the change is kept. */
+    /** Syncs the file and the saved copy. Fails if the file is incomplete, or must differ from a state but does not. */
     void commit(const FileState& before, bool mustDiffer) const;
 
-    /** Restores the file. */
+    /** Restores the file to the state that begin() returned. */
     void rollBack(const FileState& before) const;
     ///@}
 };

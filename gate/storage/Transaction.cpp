@@ -107,14 +107,14 @@ void Transaction::apply(const CMPIInstance* current, const Values& changes) cons
 }
 
 /**
- * Fails if the provider has not as many records as its file, so that its next writing would lose some: it does not
- * report that it could not read the file when it was loaded.
+ * Fails if the provider does not have as many records as its file, so that its next write would lose some: it does not
+ * report that it could not read the file.
  */
 void Transaction::requireTable() const {
     if (!file.hasRecords || theConnection.isVerified(owner)) {
         return;
     }
-    if (!file.isReadAs(session.names(LocalObjectPath(nameSpaceOf(path.handle()), owner)).size())) {
+    if (!file.hasCount(session.names(LocalObjectPath(nameSpaceOf(path.handle()), owner)).size())) {
         session.setOutdated();
         fail(CMPI_RC_ERR_FAILED, std::string(file.fileName) +
                                      " has other records than the provider. It is read again; repeat the request.");

@@ -13,8 +13,8 @@ namespace gate {
  * A change of one instance, which is stored completely or rolled back. The provider reports success in either case, so
  * the change is committed only after checks of the instance and of the data file.
  *
- * To roll a change back, the data file becomes what it was before, and the provider is loaded again, so that it reads
- * the file. It has no operation that restores a deleted record in its place.
+ * A rollback restores the data file, and the provider is loaded again to read it: it has no operation that restores a
+ * deleted record in its place.
  *
  * All functions fail with CMPI_RC_ERR_FAILED if the change cannot be stored.
  */
