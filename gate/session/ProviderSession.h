@@ -81,10 +81,14 @@ public:
     /** Marks the provider's tables as wrong: it is loaded again before the next request. */
     void setOutdated() const { theConnection.setOutdated(); }
 
-    /** Releases the lock for a call of the object manager that may take long or lead back to the gate. */
+    /**
+     * Releases the lock for a call of the object manager that may take long or lead back to the gate. Another request
+     * may load the provider again meanwhile.
+     */
     template <class Work>
     void releaseFor(Work work) {
         guard.releaseFor(work);
+        theConnection.requireCurrent(guard);
     }
 
 private:
