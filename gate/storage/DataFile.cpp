@@ -107,7 +107,7 @@ FileState DataFile::state() const {
     });
 }
 
-bool DataFile::isReadAs(std::size_t count) const {
+bool DataFile::hasCount(std::size_t count) const {
     return onFiles([&] {
         const durable::RecordFile file = recordFileOf(*this);
         const auto promised = durable::RecordFile::promisedIn(file.content().value_or(std::string()));
