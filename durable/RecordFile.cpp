@@ -138,32 +138,46 @@ void RecordFile::useSaved(std::size_t size) const {
     static_cast<void>(isShort);  // the last line of the copy does not matter
 }
 
+std::string RecordFile::defect() const {
+    const auto current = content();
+    if (!current) {
+        return name + " was missing.";
+    }
+    if (!isComplete(*current)) {
+        return name + countsOf(*current);
+    }
+    return readFile(unfinished) ? name + " held an unfinished change." : "";
+}
+
 bool RecordFile::needsRecovery() const {
-    const bool isGood = isComplete(content().value_or(std::string())) && !readFile(unfinished);
-    return !isGood && !savedContent().empty();
+    return !defect().empty() && !savedContent().empty();
+}
+
+std::string RecordFile::restoreSaved() const {
+    const std::size_t size = savedContent().size();
+    if (size == 0) {
+        return {};
+    }
+    const std::string time = timeOf(saved);
+    if (!content().value_or(std::string()).empty()) {
+        renameFile(file, damaged);
+    }
+    useSaved(size);
+    return "It was restored from the saved copy of " + time + ".";
 }
 
 std::string RecordFile::recover() const {
-    const auto current = content();
-    const bool isUnfinished = readFile(unfinished).has_value();
-    const bool isGood = current && isComplete(*current);
-    if (isGood && !isUnfinished) {
+    const std::string state = defect();
+    if (state.empty()) {
         return {};
     }
-    const std::string state = name + (!current ? " was missing."
-                                      : isGood ? " held an unfinished change."
-                                               : countsOf(*current));
-    const std::size_t size = savedContent().size();
-    if (size != 0) {
-        if (current && !current->empty()) {
-            renameFile(file, damaged);
-        }
-        const std::string time = timeOf(saved);
-        useSaved(size);
-        return state + " It was restored from the saved copy of " + time + ".";
+    const std::string restored = restoreSaved();
+    if (!restored.empty()) {
+        return state + " " + restored;
     }
     removeFile(unfinished);
-    if (!current || isGood) {
+    const auto current = content();
+    if (!current || isComplete(*current)) {
         return {};
     }
     const bool isKept = access(file.substr(0, file.rfind('/') + 1).c_str(), W_OK) == 0;
@@ -171,6 +185,12 @@ std::string RecordFile::recover() const {
         replaceFile(damaged, *current, file);
     }
     return state + " There is no saved copy." + (isKept ? " A copy of it is kept as " + damaged + "." : "");
+}
+
+void RecordFile::replace(std::string_view records) const {
+    prepare();
+    replaceFile(file, records, file);
+    syncDirectoryOf(file);
 }
 
 std::string RecordFile::countsOf(std::string_view content) const {

@@ -16,7 +16,7 @@ namespace durable {
  * |---|---|
  * | NAME.saved | the records after the last answered change, and a line with the file's name; always complete |
  * | NAME.unfinished | empty; exists during a change that writes NAME more than once |
- * | NAME.damaged | the last content of NAME that recover() replaced or could not restore |
+ * | NAME.damaged | the last content of NAME that was replaced by the saved copy, or could not be restored |
  *
  * A change is prepare(), the provider's writing, and commit() or restore(). Functions throw std::system_error if a file
  * cannot be read or written. Only the owner of the directory may call those that write.
@@ -59,8 +59,17 @@ public:
     /** Restores the file after a change. @param before the result of prepare(), not empty */
     void restore(const std::string& before) const;
 
-    /** Whether the file is incomplete or unfinished, and recover() can restore it. */
+    /** A sentence about a file that is missing, incomplete or unfinished; empty for another one. */
+    std::string defect() const;
+
+    /** Whether the file has a defect, and recover() can restore it. */
     bool needsRecovery() const;
+
+    /**
+     * Replaces the file, complete or not, by the saved copy, and keeps it as NAME.damaged.
+     * @return a message with the time of the copy; empty, and nothing is changed, if there is no complete copy
+     */
+    std::string restoreSaved() const;
 
     /**
      * Restores an incomplete or unfinished file from the saved copy. Without a saved copy, keeps a copy of it.
@@ -68,6 +77,12 @@ public:
      * @return a message for the log; empty if the file was complete
      */
     std::string recover() const;
+
+    /**
+     * Replaces the content of a file without defect: at any time, it has the old or the new records. Until the next
+     * change, the saved copy has the old ones.
+     */
+    void replace(std::string_view records) const;
 
 private:
     std::string savedContent() const;

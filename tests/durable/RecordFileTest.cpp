@@ -84,6 +84,27 @@ TEST_F(RecordFileTest, AnIncompleteFileIsRestoredFromTheSavedCopy) {
     EXPECT_THAT(file.recover(), IsEmpty()) << "it is complete now";
 }
 
+TEST_F(RecordFileTest, ACompleteFileIsReplacedByTheSavedCopyOnRequest) {
+    EXPECT_THAT(file.restoreSaved(), IsEmpty()) << "there is no copy";
+    writeFile(path, records({"W1"}));
+    file.prepare();
+    writeFile(path, records({"W2"}));
+    EXPECT_THAT(file.defect(), IsEmpty());
+    EXPECT_THAT(file.restoreSaved(), HasSubstr("restored from the saved copy of 20"));
+    EXPECT_EQ(readFile(path), records({"W1"}));
+    EXPECT_EQ(readFile(damaged), records({"W2"}));
+}
+
+TEST_F(RecordFileTest, ReplacedRecordsAreInTheSavedCopyUntilTheNextChange) {
+    writeFile(path, records({"W1"}));
+    file.replace(records({"W2"}));
+    EXPECT_EQ(readFile(path), records({"W2"}));
+    EXPECT_EQ(readFile(saved), records({"W1"}) + savedLine);
+    EXPECT_THAT(file.recover(), IsEmpty());
+    EXPECT_EQ(file.prepare(), records({"W2"}));
+    EXPECT_EQ(readFile(saved), records({"W2"}) + savedLine);
+}
+
 TEST_F(RecordFileTest, AMissingOrEmptyFileIsRestored) {
     for (const bool isEmpty : {false, true}) {
         writeFile(path, records({"W1"}));
