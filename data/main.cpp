@@ -41,7 +41,7 @@ public:
         if (result.state == durable::DirectoryLock::State::heldByOther) {
             throw InUse("The data directory " + path + " is in use by " + result.reason + ". End that process first.");
         }
-        if (result.state == durable::DirectoryLock::State::unavailable) {
+        if (result.state != durable::DirectoryLock::State::acquired) {
             throw InUse("The data directory cannot be locked. " + result.reason);
         }
     }

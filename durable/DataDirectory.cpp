@@ -3,8 +3,8 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <chrono>
-#include <stdexcept>
 #include <system_error>
 #include <thread>
 
@@ -12,58 +12,46 @@ namespace durable {
 
 namespace {
 
-/** Maximum time that a change waits for another owner to end. */
-constexpr std::chrono::seconds ownerTimeout{5};
-/** Maximum time that open() waits for another owner to finish writing. */
+/** Maximum time that open() waits for the owner to finish writing. */
 constexpr std::chrono::seconds writeTimeout{1};
 constexpr std::chrono::milliseconds pollInterval{20};
-
-/** Waits until the condition holds, but no longer than the timeout. Returns whether it holds. */
-template <class Condition>
-bool waitFor(std::chrono::seconds timeout, Condition condition) {
-    const auto end = std::chrono::steady_clock::now() + timeout;
-    bool holds = condition();
-    while (!holds && std::chrono::steady_clock::now() < end) {
-        std::this_thread::sleep_for(pollInterval);
-        holds = condition();
-    }
-    return holds;
-}
 
 }  // namespace
 
 void DataDirectory::open() {
-    std::string owner;
-    const bool isOwner = acquire(owner);
+    acquireLock();
     if (isOwner) {
         recover();
     } else {
-        waitFor(writeTimeout, [&] { return areComplete(); });
+        const auto end = std::chrono::steady_clock::now() + writeTimeout;
+        while (needRecovery() && std::chrono::steady_clock::now() < end) {
+            std::this_thread::sleep_for(pollInterval);
+        }
     }
-    hadOther = !isOwner;
+    hasOtherOwner = false;
     openStamp = stamp();
 }
 
-void DataDirectory::requireOwned() {
-    std::string owner;
-    if (!waitFor(ownerTimeout, [&] { return acquire(owner); })) {
-        throw std::runtime_error("The data directory " + path() + " is in use by " + owner +
-                                 ". Send the request to that process, or end it.");
-    }
+DataDirectory::Ownership DataDirectory::acquire() {
+    const DirectoryLock::Result result = acquireLock();
+    const bool isOther = result.state == DirectoryLock::State::heldByOther;
+    // Without record files, the provider's records are the only ones.
+    hasOtherOwner = hasOtherOwner || (result.state == DirectoryLock::State::acquired && stamp() != Stamp{});
+    return {isOwner, isOther,
+            "The data directory " + path() +
+                (isOther ? " is in use by " + result.reason + ". Send the request to that process, or end it."
+                         : " cannot be changed by this process. " + result.reason + ".")};
 }
 
-/** Whether this process may change the files now. If not, names the process that may. */
-bool DataDirectory::acquire(std::string& owner) {
-    const DirectoryLock::Result result = lock.acquire(path());
-    const bool isOther = result.state == DirectoryLock::State::heldByOther;
+DirectoryLock::Result DataDirectory::acquireLock() {
+    DirectoryLock::Result result = lock.acquire(path());
     const bool isUnavailable = result.state == DirectoryLock::State::unavailable;
-    if (isUnavailable && access(path().c_str(), F_OK) == 0 && !isReported.exchange(true)) {
+    if (isUnavailable && access(path().c_str(), F_OK) == 0 && !isReported) {
+        isReported = true;
         log("The data directory cannot be locked, so do not let two processes change it. " + result.reason);
     }
-    isOwned = !isOther;
-    hadOther = hadOther || isOther;
-    owner = result.reason;
-    return !isOther;
+    isOwner = result.state != DirectoryLock::State::heldByOther && result.state != DirectoryLock::State::denied;
+    return result;
 }
 
 void DataDirectory::recover() const {
@@ -83,22 +71,15 @@ void DataDirectory::recover() const {
     }
 }
 
-bool DataDirectory::areComplete() const {
-    for (const RecordFile& file : recordFilesIn(path())) {
-        const auto content = file.content();
-        if (content && !file.isComplete(*content)) {
-            return false;
+bool DataDirectory::needRecovery() const {
+    const std::vector<RecordFile> files = recordFilesIn(path());
+    return std::any_of(files.begin(), files.end(), [](const RecordFile& file) {
+        try {
+            return file.needsRecovery();
+        } catch (const std::system_error&) {
+            return false;  // it has no copy that this process can read
         }
-    }
-    return true;
-}
-
-bool DataDirectory::hasChanged() const {
-    return hadOther && stamp() != openStamp;
-}
-
-bool DataDirectory::isOutdated() const {
-    return hadOther && (isOwned || (hasChanged() && areComplete()));
+    });
 }
 
 DataDirectory::Stamp DataDirectory::stamp() const {

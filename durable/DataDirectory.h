@@ -4,14 +4,13 @@
 #include "RecordFile.h"
 
 #include <array>
-#include <atomic>
 #include <string>
 
 namespace durable {
 
 /**
  * The agent's data directory. The process that holds its lock is the owner, which recovers the record files and makes
- * changes. Another process reads. Where locks are unavailable, every process acts as the owner, and the log says so.
+ * changes. Another process only reads. Where locks are unavailable, every process is an owner, and the log says so.
  */
 class DataDirectory {
 public:
@@ -23,41 +22,46 @@ public:
         : path(itsPath), log(itsLog) {}
 
     /**
-     * Called before the provider is loaded. The owner recovers the record files. Another process waits at most a second
-     * until they are complete. Throws std::system_error if a file cannot be checked or restored.
+     * Called before the provider is loaded. Acquires the lock if possible. The owner recovers the record files; another
+     * process waits at most a second until they need no recovery. Throws std::system_error if a file cannot be checked
+     * or restored.
      */
     void open();
 
     /** Releases the lock. Called when the provider is unloaded. */
     void close() { lock.release(); }
 
-    /**
-     * Ensures that this process is the owner. Waits some seconds for another owner to end, then throws
-     * std::runtime_error, which names it.
-     */
-    void requireOwned();
+    /** The result of acquire(). */
+    struct Ownership {
+        bool isOwner;
+        bool isOtherProcess;  ///< whether another process is the owner, and may end
+        std::string reason;   ///< a message if this process is not the owner
+    };
+
+    /** Tries to become the owner, for a change. Returns at once. */
+    Ownership acquire();
 
     /** Whether another process has written the files since open(). It may not have finished. */
-    bool hasChanged() const;
+    bool hasChanged() const { return !isOwner && stamp() != openStamp; }
 
-    /** Whether the provider has to be loaded again: another process has changed the files, or has been the owner. */
-    bool isOutdated() const;
+    /** Whether the provider has to be loaded again, because another process has changed the files or may have. */
+    bool isOutdated() const { return hasOtherOwner || (hasChanged() && !needRecovery()); }
 
 private:
     /** The inodes, sizes and times of the record files. */
     using Stamp = std::array<std::array<long long, 4>, recordFileCount>;
 
-    bool acquire(std::string& owner);
+    DirectoryLock::Result acquireLock();
     void recover() const;
-    bool areComplete() const;
+    bool needRecovery() const;
     Stamp stamp() const;
 
     std::string (*path)();
     void (*log)(const std::string&);
     DirectoryLock lock{};
-    std::atomic<bool> isOwned{false};
-    std::atomic<bool> isReported{false};
-    std::atomic<bool> hadOther{false};  ///< whether another process was the owner at open() or since
+    bool isOwner = false;
+    bool isReported = false;
+    bool hasOtherOwner = false;  ///< whether another process may have been the owner since open()
     Stamp openStamp{};
 };
 

@@ -25,24 +25,29 @@ struct flock lockOfFile() {
 }  // namespace
 
 DirectoryLock::Result DirectoryLock::acquire(const std::string& directory) {
-    const std::lock_guard<std::mutex> guard(mutex);
     const std::string path = directory + "owner";
     if (isHeldIn(path)) {
         return {State::held};
     }
-    closeFile();  // inherited from the parent process, or removed from the directory
+    release();  // inherited from the parent process, or removed from the directory
     descriptor = open(path.c_str(), O_RDWR | O_CREAT | O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK, 0644);
+    const bool isOpen = descriptor >= 0;
     struct flock lock = lockOfFile();
-    if (descriptor >= 0 && fcntl(descriptor, F_SETLK, &lock) == 0) {
+    if (isOpen && fcntl(descriptor, F_SETLK, &lock) == 0) {
         process = getpid();
         writeOwner();
-        return {State::held};
+        return {State::acquired};
     }
     const int error = errno;
-    const bool isOther = descriptor >= 0 && (error == EACCES || error == EAGAIN);
-    Result result{isOther ? State::heldByOther : State::unavailable,
+    if (!isOpen && (error == EMFILE || error == ENFILE || error == ENOMEM || error == EIO)) {
+        throw std::system_error(error, std::generic_category(), path);
+    }
+    const bool isOther = isOpen && (error == EACCES || error == EAGAIN);
+    Result result{isOther                     ? State::heldByOther
+                  : isOpen || error == ENOENT ? State::unavailable
+                                              : State::denied,
                   isOther ? ownerOf(path) : path + ": " + std::generic_category().message(error)};
-    closeFile();
+    release();
     return result;
 }
 
@@ -55,11 +60,6 @@ bool DirectoryLock::isHeldIn(const std::string& path) const {
 }
 
 void DirectoryLock::release() {
-    const std::lock_guard<std::mutex> guard(mutex);
-    closeFile();
-}
-
-void DirectoryLock::closeFile() {
     if (descriptor >= 0) {
         close(descriptor);
         descriptor = -1;

@@ -2,7 +2,6 @@
 
 #include <sys/types.h>
 
-#include <mutex>
 #include <string>
 
 namespace durable {
@@ -17,35 +16,36 @@ namespace durable {
 class DirectoryLock {
 public:
     enum class State {
-        held,
+        held,      ///< since an earlier call
+        acquired,  ///< by this call
         heldByOther,
-        unavailable  ///< the file cannot be created, or its file system has no locks
+        denied,       ///< this process must not write the file
+        unavailable,  ///< the directory is missing, or its file system has no locks
     };
 
     struct Result {
         State state;
-        std::string reason{};  ///< the process that holds it, or why it is unavailable
+        std::string reason{};  ///< the process that holds it, or why it is denied or unavailable
     };
 
     constexpr DirectoryLock() = default;
-    ~DirectoryLock() {
-        closeFile();  // without the mutex, which another thread may have held when this process was forked
-    }
+    ~DirectoryLock() { release(); }
     DirectoryLock(const DirectoryLock&) = delete;
     DirectoryLock& operator=(const DirectoryLock&) = delete;
 
-    /** Acquires the lock, unless this process holds it, and returns at once. Creates the file. */
+    /**
+     * Acquires the lock, unless this process holds it, and returns at once. Creates the file if it may. Throws
+     * std::system_error if the system lacks resources.
+     */
     Result acquire(const std::string& directory);
 
     void release();
 
 private:
     bool isHeldIn(const std::string& path) const;
-    void closeFile();
     void writeOwner() const;
     std::string ownerOf(const std::string& path) const;
 
-    std::mutex mutex{};
     int descriptor = -1;
     pid_t process = 0;  ///< the process that acquired it; a forked child has the descriptor but not the lock
 };

@@ -6,6 +6,8 @@
 
 #include <cerrno>
 #include <cstdio>
+#include <cstdlib>
+#include <memory>
 #include <system_error>
 
 namespace durable {
@@ -87,6 +89,15 @@ private:
     const int number;
 };
 
+/** Creates or truncates a file. @param flags more flags of open() */
+void writeFile(const std::string& path, int flags, std::string_view content, const std::string& model) {
+    const Descriptor file(path, O_WRONLY | O_CREAT | O_TRUNC | O_NOFOLLOW | O_NONBLOCK | flags, 0600);
+    require(file.isOpen(), path);
+    file.beLike(model);
+    file.writeAll(content);
+    file.sync();
+}
+
 }  // namespace
 
 std::optional<std::string> readFile(const std::string& path) {
@@ -97,15 +108,9 @@ std::optional<std::string> readFile(const std::string& path) {
 
 void replaceFile(const std::string& path, std::string_view content, const std::string& model) {
     const std::string temporary = path + ".new";
-    removeFile(temporary);
+    unlink(temporary.c_str());
     try {
-        {
-            const Descriptor file(temporary, O_WRONLY | O_CREAT | O_EXCL, 0600);
-            require(file.isOpen(), temporary);
-            file.beLike(model);
-            file.writeAll(content);
-            file.sync();
-        }
+        writeFile(temporary, O_EXCL, content, model);
         renameFile(temporary, path);
     } catch (...) {
         unlink(temporary.c_str());
@@ -113,8 +118,12 @@ void replaceFile(const std::string& path, std::string_view content, const std::s
     }
 }
 
+void overwriteFile(const std::string& path, std::string_view content, const std::string& model) {
+    writeFile(path, 0, content, model);
+}
+
 void createFile(const std::string& path) {
-    const Descriptor file(path, O_WRONLY | O_CREAT, 0600);
+    const Descriptor file(path, O_WRONLY | O_CREAT | O_NOFOLLOW | O_NONBLOCK, 0600);
     require(file.isOpen(), path);
 }
 
@@ -122,8 +131,9 @@ void renameFile(const std::string& from, const std::string& to) {
     require(rename(from.c_str(), to.c_str()) == 0, to);
 }
 
-void removeFile(const std::string& path) {
-    require(unlink(path.c_str()) == 0 || errno == ENOENT, path);
+std::string resolvedPath(const std::string& path) {
+    const std::unique_ptr<char, decltype(&std::free)> resolved(realpath(path.c_str(), nullptr), &std::free);
+    return resolved != nullptr ? resolved.get() : path;
 }
 
 void syncFile(const std::string& path) {

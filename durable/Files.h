@@ -19,14 +19,21 @@ std::optional<std::string> readFile(const std::string& path);
  */
 void replaceFile(const std::string& path, std::string_view content, const std::string& model);
 
+/**
+ * Writes a file in place, without following a link. The new content is on the disk when the function returns; meanwhile
+ * the file is incomplete.
+ * @param model as for replaceFile()
+ */
+void overwriteFile(const std::string& path, std::string_view content, const std::string& model);
+
 /** Creates an empty file, unless it exists. Its name is on the disk after syncDirectoryOf(). */
 void createFile(const std::string& path);
 
 /** Renames a file. The new name is on the disk after syncDirectoryOf(). */
 void renameFile(const std::string& from, const std::string& to);
 
-/** Removes a file, if it exists. */
-void removeFile(const std::string& path);
+/** The path without links; the same path if there is no such file. */
+std::string resolvedPath(const std::string& path);
 
 /** Writes the data of a file to the disk. */
 void syncFile(const std::string& path);

@@ -51,11 +51,9 @@ std::string timeOf(const std::string& path) {
 
 RecordFile::RecordFile(const std::string& directory, const char* fileName, std::size_t linesPerRecord)
     : name(fileName),
-      file(directory + name),
-      saved(file + ".saved"),
-      unfinished(file + ".unfinished"),
+      file(resolvedPath(directory + name)),
       damaged(file + ".damaged"),
-      lastLine("saved copy of " + name + "\n"),
+      copies(file),
       lines(linesPerRecord) {}
 
 std::optional<std::string> RecordFile::content() const {
@@ -82,60 +80,35 @@ bool RecordFile::isComplete(std::string_view content) const {
     return promised && !hasHoles && hasEnd && presentIn(content) == *promised;
 }
 
-/** The records of the saved copy; empty if it cannot be used. */
-std::string RecordFile::savedContent() const {
-    std::string records = readFile(saved).value_or(std::string());
-    const bool isCopy = endsWith(records, lastLine);
-    records.resize(isCopy ? records.size() - lastLine.size() : 0);
-    return isComplete(records) ? records : std::string();
+SavedCopies::Copy RecordFile::savedCopy() const {
+    SavedCopies::Copy copy = copies.latest();
+    copy.content.resize(isComplete(copy.content) ? copy.content.size() : 0);
+    return copy;
 }
 
-void RecordFile::save(std::string_view records) const {
-    replaceFile(saved, std::string(records) + lastLine, file);
-    syncDirectoryOf(file);
-}
-
-std::string RecordFile::prepare() const {
-    const std::string current = content().value_or(std::string());
-    const std::string copy = savedContent();
-    const std::string records = isComplete(current) ? current : !copy.empty() || !current.empty() ? copy : "0\n";
-    if (!records.empty() && records != copy) {
-        save(records);
+std::string RecordFile::prepare(const std::string& current, bool hasSteps) const {
+    const std::string copy = savedCopy().content;
+    const std::string records = isComplete(current) ? current : current.empty() && copy.empty() ? "0\n" : copy;
+    if (!records.empty() && (records != copy || hasSteps)) {
+        copies.save(records, hasSteps);
     }
     return records;
 }
 
-void RecordFile::markUnfinished() const {
-    createFile(unfinished);
-    syncDirectoryOf(file);
-}
-
 void RecordFile::commit(std::string_view written) const {
     syncFile(file);
-    save(written);
-    removeFile(unfinished);
+    copies.save(written, false);
 }
 
 void RecordFile::restore(const std::string& before) const {
-    if (content() == before) {
-        return removeFile(unfinished);
+    const bool isRestored = content() == before;
+    const SavedCopies::Copy copy = savedCopy();
+    if (copy.content != before || (isRestored && copy.isUnfinished)) {
+        copies.save(before, false);
     }
-    if (savedContent() != before) {
-        save(before);
+    if (!isRestored) {
+        copies.restoreLatest();
     }
-    useSaved(before.size());
-}
-
-/**
- * Renames the saved copy to the record file, which needs no disk space. The next change makes another copy first. The
- * directory is synced before the file is shortened: until the new name is on the disk, the copy must stay complete.
- */
-void RecordFile::useSaved(std::size_t size) const {
-    renameFile(saved, file);
-    syncDirectoryOf(file);
-    removeFile(unfinished);
-    const bool isShort = truncate(file.c_str(), static_cast<off_t>(size)) == 0;
-    static_cast<void>(isShort);  // the last line of the copy does not matter
 }
 
 std::string RecordFile::defect() const {
@@ -146,23 +119,23 @@ std::string RecordFile::defect() const {
     if (!isComplete(*current)) {
         return name + countsOf(*current);
     }
-    return readFile(unfinished) ? name + " held an unfinished change." : "";
+    return savedCopy().isUnfinished ? name + " held an unfinished change." : "";
 }
 
 bool RecordFile::needsRecovery() const {
-    return !defect().empty() && !savedContent().empty();
+    return !savedCopy().content.empty() && !defect().empty();
 }
 
 std::string RecordFile::restoreSaved() const {
-    const std::size_t size = savedContent().size();
-    if (size == 0) {
+    const SavedCopies::Copy copy = savedCopy();
+    if (copy.content.empty()) {
         return {};
     }
-    const std::string time = timeOf(saved);
     if (!content().value_or(std::string()).empty()) {
         renameFile(file, damaged);
     }
-    useSaved(size);
+    const std::string time = timeOf(copy.path);
+    copies.restoreLatest();
     return "It was restored from the saved copy of " + time + ".";
 }
 
@@ -175,20 +148,19 @@ std::string RecordFile::recover() const {
     if (!restored.empty()) {
         return state + " " + restored;
     }
-    removeFile(unfinished);
-    const auto current = content();
-    if (!current || isComplete(*current)) {
+    const std::string current = content().value_or(std::string());
+    if (current.empty() || isComplete(current)) {
         return {};
     }
     const bool isKept = access(file.substr(0, file.rfind('/') + 1).c_str(), W_OK) == 0;
     if (isKept) {
-        replaceFile(damaged, *current, file);
+        replaceFile(damaged, current, file);
     }
     return state + " There is no saved copy." + (isKept ? " A copy of it is kept as " + damaged + "." : "");
 }
 
 void RecordFile::replace(std::string_view records) const {
-    prepare();
+    prepare(content().value_or(std::string()), false);
     replaceFile(file, records, file);
     syncDirectoryOf(file);
 }

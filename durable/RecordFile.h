@@ -1,5 +1,7 @@
 #pragma once
 
+#include "SavedCopies.h"
+
 #include <cstddef>
 #include <optional>
 #include <string>
@@ -14,9 +16,8 @@ namespace durable {
  *
  * | File | Content |
  * |---|---|
- * | NAME.saved | the records after the last answered change, and a line with the file's name; always complete |
- * | NAME.unfinished | empty; exists during a change that writes NAME more than once |
- * | NAME.damaged | the last content of NAME that was replaced by the saved copy, or could not be restored |
+ * | NAME.saved1, NAME.saved2 | copies; the newer one has the records after the last answered change |
+ * | NAME.damaged | the last content of NAME that the saved copy replaced, or that could not be restored |
  *
  * A change is prepare(), the provider's writing, and commit() or restore(). Functions throw std::system_error if a file
  * cannot be read or written. Only the owner of the directory may call those that write.
@@ -26,6 +27,7 @@ public:
     /** @param linesPerRecord after the first line, which is the number of records */
     RecordFile(const std::string& directory, const char* fileName, std::size_t linesPerRecord);
 
+    /** The path; if NAME is a symbolic link, of its target. */
     const std::string& path() const { return file; }
 
     /** The content; none if there is no file. */
@@ -41,17 +43,16 @@ public:
     bool isComplete(std::string_view content) const;
 
     /**
-     * Ensures that the saved copy has the current records: those of the file or, if that is incomplete, of the existing
-     * copy. A missing or empty file without a copy has none.
+     * Ensures that the latest copy has the current records: those of the file or, if that is incomplete, of the
+     * existing copy. A missing or empty file without a copy has none.
+     * @param current the content of the file; empty if there is none
+     * @param hasSteps whether the change writes the file more than once; recover() discards its intermediate states
      * @return what restore() needs; empty for an incomplete file without a copy
      */
-    std::string prepare() const;
-
-    /** Marks a change that writes the file more than once, so that recover() discards its intermediate states. */
-    void markUnfinished() const;
+    std::string prepare(const std::string& current, bool hasSteps) const;
 
     /**
-     * Writes the file to the disk, then its records to the saved copy. After that the change may be answered.
+     * Writes the file to the disk, then its records to a copy. After that the change may be answered.
      * @param written the content, which is complete
      */
     void commit(std::string_view written) const;
@@ -59,11 +60,14 @@ public:
     /** Restores the file after a change. @param before the result of prepare(), not empty */
     void restore(const std::string& before) const;
 
-    /** A sentence about a file that is missing, incomplete or unfinished; empty for another one. */
+    /** A sentence about a file that is missing, incomplete or has an intermediate state; empty for another one. */
     std::string defect() const;
 
-    /** Whether the file has a defect, and recover() can restore it. */
+    /** Whether the file has a defect, and there is a copy. */
     bool needsRecovery() const;
+
+    /** The newer copy. Without a complete one, its content is empty. */
+    SavedCopies::Copy savedCopy() const;
 
     /**
      * Replaces the file, complete or not, by the saved copy, and keeps it as NAME.damaged.
@@ -72,8 +76,8 @@ public:
     std::string restoreSaved() const;
 
     /**
-     * Restores an incomplete or unfinished file from the saved copy. Without a saved copy, keeps a copy of it.
-     * Call it before the provider is loaded and reads its files.
+     * Restores a file that needsRecovery() from the saved copy. Without a saved copy, keeps a copy of an incomplete
+     * file that is not empty. Call it before the provider is loaded and reads its files.
      * @return a message for the log; empty if the file was complete
      */
     std::string recover() const;
@@ -85,18 +89,13 @@ public:
     void replace(std::string_view records) const;
 
 private:
-    std::string savedContent() const;
-    void save(std::string_view records) const;
-    void useSaved(std::size_t size) const;
     std::string countsOf(std::string_view content) const;
 
     std::string name;
     std::string file;
-    std::string saved;
-    std::string unfinished;
     std::string damaged;
-    std::string lastLine;  ///< of the saved copy; shows that it is complete and which file it copies
-    std::size_t lines;     ///< per record
+    SavedCopies copies;
+    std::size_t lines;  ///< per record
 };
 
 /** The number of record files in a data directory. */

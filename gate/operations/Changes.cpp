@@ -61,8 +61,7 @@ void createInstance(const Request& request, const CMPIInstance* instance) {
     const Class& requested = request.requestedClass();
     const DataFile& file = recordFileOf(requested);
     requireInstance(instance);
-    theConnection.requireOwnedDirectory();
-    ProviderSession session(request);
+    ProviderSession session(request, ProviderSession::Access::change);
     const Property& key = *findProperty(requested, "InstanceID");
     const std::string identifier = identifierOf(request.path, instance, key, requested);
     requireKnownProperties(requested, instance);
@@ -83,8 +82,7 @@ void modifyInstance(const Request& request, const CMPIInstance* instance, const 
     requireInstance(instance);
     const PropertyList list(properties, requested);
     list.requireKnown();
-    theConnection.requireOwnedDirectory();
-    ProviderSession session(request);
+    ProviderSession session(request, ProviderSession::Access::change);
     const LocalObjectPath path = localPath(request.path, requested);
     requireKnownProperties(requested, instance);
     const Values given = valuesOf(instance, requested, [&](const Property& property) { return list.has(property); });
@@ -98,8 +96,7 @@ void modifyInstance(const Request& request, const CMPIInstance* instance, const 
 void deleteInstance(const Request& request) {
     const Class& requested = request.requestedClass();
     const DataFile& file = recordFileOf(requested);
-    theConnection.requireOwnedDirectory();
-    ProviderSession session(request);
+    ProviderSession session(request, ProviderSession::Access::change);
     const LocalObjectPath path = localPath(request.path, requested);
     session.get(path, requested);  // there must be one
     Transaction(session, requested, file, path).remove();

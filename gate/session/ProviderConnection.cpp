@@ -4,10 +4,10 @@
 
 #include "KO/PlatformUtilities.h"
 
+#include <cxxabi.h>
 #include <dlfcn.h>
 
 #include <chrono>
-#include <cstdlib>
 #include <exception>
 #include <thread>
 
@@ -21,13 +21,17 @@ namespace {
  */
 constexpr std::chrono::seconds drainTimeout{5};
 
-/** How long a request waits for up-calls of the provider before that is loaded again. */
-constexpr std::chrono::seconds upCallTimeout{5};
+/** How long a request waits for another owner of the data directory, and for up-calls of the provider. */
+constexpr std::chrono::seconds waitTimeout{5};
 constexpr std::chrono::milliseconds pollInterval{10};
 
-/** Called when this library is unloaded and when the process ends. */
-void endAtExit() {
-    theRequestLock.close(drainTimeout, RequestLock::Closing::permanent, [] { theConnection.endProcess(); });
+/** Releases the lock while the condition holds, but not much longer than the timeout. */
+template <class Condition>
+void waitWhile(LockGuard& guard, Condition condition) {
+    const auto end = std::chrono::steady_clock::now() + waitTimeout;
+    while (condition() && std::chrono::steady_clock::now() < end) {
+        guard.releaseFor([] { std::this_thread::sleep_for(pollInterval); });
+    }
 }
 
 /** Keeps this library and its dependencies in the process, for a request that is still running in them. */
@@ -45,6 +49,36 @@ durable::DataDirectory theDirectory{[] { return std::string(KO::PlatformUtilitie
 }  // namespace
 
 ProviderConnection theConnection;
+
+namespace {
+
+/** Shuts down when this library is unloaded and when the process ends. */
+class ShutdownAtExit {
+public:
+    ~ShutdownAtExit() { abi::__cxa_finalize(this); }
+
+    /** Called after the provider was loaded: then no request is running when its static objects are destroyed. */
+    void registerAgain() {
+        isRegistering = true;
+        abi::__cxa_finalize(this);  // calls and forgets the earlier registration
+        isRegistering = false;
+        abi::__cxa_atexit(
+            [](void* self) {
+                if (!static_cast<ShutdownAtExit*>(self)->isRegistering) {
+                    theRequestLock.close(drainTimeout, RequestLock::Closing::permanent,
+                                         [] { theConnection.endProcess(); });
+                }
+            },
+            this, this);
+    }
+
+private:
+    bool isRegistering = false;
+};
+
+ShutdownAtExit shutdownAtExit;  // destroyed before the objects above
+
+}  // namespace
 
 void ProviderConnection::connect(const CMPIBroker* manager) {
     const bool isOpen = theRequestLock.open();
@@ -67,8 +101,15 @@ void ProviderConnection::connect(const CMPIBroker* manager) {
     set(manager);
 }
 
-void ProviderConnection::requireOwnedDirectory() {
-    theDirectory.requireOwned();
+void ProviderConnection::requireOwner(LockGuard& guard) {
+    durable::DataDirectory::Ownership ownership{};
+    waitWhile(guard, [&] {
+        ownership = theDirectory.acquire();
+        return ownership.isOtherProcess;
+    });
+    if (!ownership.isOwner) {
+        fail(CMPI_RC_ERR_FAILED, ownership.reason);
+    }
 }
 
 bool ProviderConnection::needsLoading() const {
@@ -76,10 +117,7 @@ bool ProviderConnection::needsLoading() const {
 }
 
 void ProviderConnection::requireCurrent(LockGuard& guard) {
-    const auto end = std::chrono::steady_clock::now() + upCallTimeout;
-    while (needsLoading() && upCalls != 0 && std::chrono::steady_clock::now() < end) {
-        guard.releaseFor([] { std::this_thread::sleep_for(pollInterval); });
-    }
+    waitWhile(guard, [&] { return needsLoading() && upCalls != 0; });
     if (needsLoading()) {
         if (upCalls != 0) {
             fail(CMPI_RC_ERR_FAILED,
@@ -94,26 +132,20 @@ void ProviderConnection::load() {
     constexpr int attempts = 10;
     isOutdated = true;
     for (int attempt = 0; attempt == 0 || (theDirectory.hasChanged() && attempt < attempts); ++attempt) {
+        unload();
         theDirectory.open();
-        if (!unload()) {
-            logError(
-                "The provider is also loaded without the gate, so it cannot read its files again. "
-                "Register only one.");
-        }
         library.load();
     }
-    // Registered after the provider's static objects, so that no request is running when these are destroyed.
-    std::atexit(endAtExit);
+    shutdownAtExit.registerAgain();
     createInterfaces();
     isOutdated = false;
     verified = 0;
 }
 
-/** Unloads the provider if it is loaded. Returns false if it stays in the process. */
-bool ProviderConnection::unload() {
+void ProviderConnection::unload() {
     instances = nullptr;
     associations = nullptr;
-    return !library.isLoaded() || library.unload();
+    library.unload();
 }
 
 void ProviderConnection::createInterfaces() {

@@ -26,12 +26,6 @@ public:
      */
     void connect(const CMPIBroker* manager);
 
-    /**
-     * Waits some seconds until this process owns the data directory. Throws std::runtime_error if another one does.
-     * Called before a change, without the request lock.
-     */
-    void requireOwnedDirectory();
-
     /** Unloads the provider when the process ends. */
     void endProcess();
 
@@ -46,6 +40,12 @@ public:
     WrappedBroker& wrappedBroker() { return *wrapped; }
     CMPIInstanceMI* instanceInterface() const { return instances; }
     CMPIAssociationMI* associationInterface() const { return associations; }
+
+    /**
+     * Ensures that this process owns the data directory, for a change. Releases the lock until another owner ends.
+     * Fails with CMPI_RC_ERR_FAILED if that takes too long.
+     */
+    void requireOwner(LockGuard& guard);
 
     /** Marks the provider's tables as different from its files, so that requireCurrent() loads it again. */
     void setOutdated() { isOutdated = true; }
@@ -66,7 +66,7 @@ private:
 
     bool needsLoading() const;
     void load();
-    bool unload();
+    void unload();
     void createInterfaces();
     void beginUpCall();
     void endUpCall();

@@ -30,21 +30,23 @@ Interface* callFactory(void* library, const char* name, const CMPIBroker* broker
 }  // namespace
 
 void ProviderLibrary::load() {
-    handle = dlopen(libraryPath().c_str(), RTLD_NOW | RTLD_LOCAL);
+    const std::string path = libraryPath();
+    if (void* const other = dlopen(path.c_str(), RTLD_NOW | RTLD_NOLOAD)) {
+        dlclose(other);
+        throw std::runtime_error("The provider is also loaded without the gate. Register only one of them.");
+    }
+    handle = dlopen(path.c_str(), RTLD_NOW | RTLD_LOCAL);
     if (handle == nullptr) {
         const char* reason = dlerror();
         throw std::runtime_error(std::string("The provider cannot be loaded: ") + (reason == nullptr ? "" : reason));
     }
 }
 
-bool ProviderLibrary::unload() {
-    dlclose(handle);
-    handle = nullptr;
-    void* const other = dlopen(libraryPath().c_str(), RTLD_NOW | RTLD_NOLOAD);
-    if (other != nullptr) {
-        dlclose(other);
+void ProviderLibrary::unload() {
+    if (handle != nullptr) {
+        dlclose(handle);
+        handle = nullptr;
     }
-    return other == nullptr;
 }
 
 CMPIInstanceMI* ProviderLibrary::createInstanceMI(const CMPIBroker* broker) const {

@@ -12,11 +12,14 @@ class ProviderLibrary {
 public:
     bool isLoaded() const { return handle != nullptr; }
 
-    /** Loads the library. Throws std::runtime_error with the reason. */
+    /**
+     * Loads the library. Throws std::runtime_error with the reason, also if another part of the process has loaded it:
+     * the provider would not read its files again.
+     */
     void load();
 
-    /** Unloads it. Returns false if it stays in the process, because another part of the process has loaded it. */
-    bool unload();
+    /** Unloads the library if it is loaded. */
+    void unload();
 
     /** @name The factories, while it is loaded. Null if the provider returns no interface. */
     ///@{

@@ -60,7 +60,10 @@ public:
     using Paths = std::vector<const CMPIObjectPath*>;
     using Instances = std::vector<const CMPIInstance*>;
 
-    explicit ProviderSession(const Request& itsRequest);
+    enum class Access { read, change };
+
+    /** Begins the session. For a change, this process must own the data directory. */
+    explicit ProviderSession(const Request& itsRequest, Access access = Access::read);
 
     const CMPIBroker* broker() const { return request.broker(); }
 

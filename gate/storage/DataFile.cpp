@@ -14,7 +14,6 @@
 #include <cerrno>
 #include <filesystem>
 #include <iterator>
-#include <sstream>
 #include <system_error>
 
 namespace gate {
@@ -72,6 +71,12 @@ bool hasRoom(const std::string& directory, std::size_t growth) {
     return blocks > (growth + block) / system.f_frsize;
 }
 
+/** Whether a line of a record file is the identifier. */
+bool hasRecord(const std::string& content, std::string identifier) {
+    std::replace(identifier.begin(), identifier.end(), ' ', '_');
+    return ('\n' + content).find('\n' + identifier + '\n') != std::string::npos;
+}
+
 /** Calls a function, and reports the errors of files to the client. */
 template <class Work>
 auto onFiles(Work work) {
@@ -115,34 +120,16 @@ bool DataFile::hasCount(std::size_t count) const {
     });
 }
 
-void DataFile::requireRecord(const std::string& identifier) const {
-    std::string stored = identifier;
-    std::replace(stored.begin(), stored.end(), ' ', '_');
-    std::istringstream lines(state().content);
-    std::string line;
-    while (line != stored && std::getline(lines, line)) {
-    }
-    if (line != stored) {
-        fail(CMPI_RC_ERR_FAILED, std::string(fileName) + " does not hold " + identifier + ".");
-    }
-}
-
 FileState DataFile::begin(bool hasSteps) const {
     FileState before = state();
     before.restorable = before.content;
     if (hasRecords) {
-        onFiles([&] {
-            const durable::RecordFile file = recordFileOf(*this);
-            before.restorable = file.prepare();
-            if (hasSteps) {
-                file.markUnfinished();
-            }
-        });
+        before.restorable = onFiles([&] { return recordFileOf(*this).prepare(before.content, hasSteps); });
     }
     return before;
 }
 
-void DataFile::commit(const FileState& before, bool mustDiffer) const {
+void DataFile::commit(const FileState& before, bool mustDiffer, const std::string* identifier) const {
     if (!hasRecords) {
         return;
     }
@@ -153,6 +140,9 @@ void DataFile::commit(const FileState& before, bool mustDiffer) const {
     const durable::RecordFile file = recordFileOf(*this);
     if (!file.isComplete(now.content)) {
         failToStore(file.path(), "it does not hold all records; the disk may be full");
+    }
+    if (identifier != nullptr && !hasRecord(now.content, *identifier)) {
+        fail(CMPI_RC_ERR_FAILED, std::string(fileName) + " does not hold " + *identifier + ".");
     }
     onFiles([&] { file.commit(now.content); });
 }

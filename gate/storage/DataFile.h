@@ -40,16 +40,16 @@ struct DataFile {
     /** Whether the record file needs no recovery and has this number of records. */
     bool hasCount(std::size_t count) const;
 
-    /** Fails if a line of the record file is not the identifier. */
-    void requireRecord(const std::string& identifier) const;
-
     /** @name Storing a change: begin(), the provider's writing, then commit() or rollBack() */
     ///@{
     /** Returns the state before the change. @param hasSteps whether the change writes the file more than once */
     FileState begin(bool hasSteps) const;
 
-    /** Syncs the file and the saved copy. Fails if the file is incomplete, or must differ from a state but does not. */
-    void commit(const FileState& before, bool mustDiffer) const;
+    /**
+     * Syncs the file and the saved copy. Fails if the file is incomplete, or must differ from a state but does not.
+     * @param identifier of a record that the file must have; null for none
+     */
+    void commit(const FileState& before, bool mustDiffer, const std::string* identifier = nullptr) const;
 
     /** Restores the file to the state that begin() returned. */
     void rollBack(const FileState& before) const;

@@ -75,12 +75,11 @@ void Transaction::create(const std::string& identifier, const Values& given, con
         session.create(path);
         const CMPIInstance* current = session.get(path, owner);
         const Values changes = diff(current, given, false);
-        const FileState created = file.state();
+        const FileState created = altersFile(file, current, changes) ? file.state() : before;
         if (!changes.empty()) {
             apply(current, changes);
         }
-        file.requireRecord(identifier);
-        file.commit(altersFile(file, current, changes) ? created : before, true);
+        file.commit(created, true, &identifier);
         returnPath();
     });
 }

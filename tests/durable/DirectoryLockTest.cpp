@@ -45,11 +45,11 @@ protected:
 };
 
 TEST_F(DirectoryLockTest, IsHeldByOneProcess) {
-    EXPECT_EQ(held.acquire(path).state, State::held);
-    EXPECT_EQ(held.acquire(path).state, State::held) << "again";
+    EXPECT_EQ(held.acquire(path).state, State::acquired);
+    EXPECT_EQ(held.acquire(path).state, State::held) << "already";
     EXPECT_EQ(stateInChild(), State::heldByOther);
     held.release();
-    EXPECT_EQ(stateInChild(), State::held);
+    EXPECT_EQ(stateInChild(), State::acquired);
 }
 
 TEST_F(DirectoryLockTest, NamesItsOwner) {
@@ -78,7 +78,7 @@ TEST_F(DirectoryLockTest, EndsWithItsProcess) {
     EXPECT_EQ(stateInChild(), State::heldByOther);
     kill(owner, SIGKILL);
     waitpid(owner, nullptr, 0);
-    EXPECT_EQ(held.acquire(path).state, State::held);
+    EXPECT_EQ(held.acquire(path).state, State::acquired);
     close(ready[0]);
     close(ready[1]);
 }
@@ -96,7 +96,7 @@ TEST_F(DirectoryLockTest, AForkedChildNeitherHoldsNorKeepsIt) {
         _exit(static_cast<int>(read(end[0], &byte, 1)));  // until the parent closes the pipe
     }
     held.release();
-    EXPECT_EQ(stateInChild(), State::held) << "while the child has inherited the file";
+    EXPECT_EQ(stateInChild(), State::acquired) << "while the child has inherited the file";
     close(end[0]);
     close(end[1]);
     waitpid(child, nullptr, 0);
@@ -104,14 +104,28 @@ TEST_F(DirectoryLockTest, AForkedChildNeitherHoldsNorKeepsIt) {
 
 TEST_F(DirectoryLockTest, ACopiedFileLocksNothing) {
     testsupport::writeFile(directory.path() / "owner", "1 init\n");
-    EXPECT_EQ(held.acquire(path).state, State::held);
+    EXPECT_EQ(held.acquire(path).state, State::acquired);
 }
 
 TEST_F(DirectoryLockTest, FollowsADirectoryThatIsReplaced) {
     held.acquire(path);
     std::filesystem::remove(directory.path() / "owner");
-    EXPECT_EQ(held.acquire(path).state, State::held);
+    EXPECT_EQ(held.acquire(path).state, State::acquired);
     EXPECT_EQ(stateInChild(), State::heldByOther);
+}
+
+TEST_F(DirectoryLockTest, IsDeniedToAProcessThatMustNotWriteItsFile) {
+    held.acquire(path);
+    held.release();
+    std::filesystem::permissions(directory.path(), std::filesystem::perms(0755));
+    EXPECT_EQ(inChild([&] {
+                  constexpr uid_t unprivileged = 65534;
+                  DirectoryLock lock;
+                  return geteuid() == 0 && setresuid(unprivileged, unprivileged, unprivileged) != 0
+                             ? 127
+                             : static_cast<int>(lock.acquire(path).state);
+              }),
+              static_cast<int>(geteuid() == 0 ? State::denied : State::acquired));
 }
 
 TEST_F(DirectoryLockTest, ReportsWhyItIsUnavailable) {

@@ -30,18 +30,21 @@ std::string records(std::initializer_list<const char*> identifiers) {
     return content;
 }
 
-const std::string savedLine = "saved copy of Warranty.dat\n";
-
 class RecordFileTest : public testing::Test {
 protected:
+    /** Prepares a change of the current content. */
+    std::string prepare(bool hasSteps = false) const {
+        return file.prepare(file.content().value_or(std::string()), hasSteps);
+    }
+
     fs::path in(const char* name) const { return directory.path() / name; }
 
     const testsupport::TempDirectory directory;
     const RecordFile file = recordFileIn(directory.withSlash(), "Warranty.dat");
     const fs::path path = in("Warranty.dat");
-    const fs::path saved = in("Warranty.dat.saved");
+    const fs::path saved = in("Warranty.dat.saved1");  ///< the first copy
+    const fs::path second = in("Warranty.dat.saved2");
     const fs::path damaged = in("Warranty.dat.damaged");
-    const fs::path unfinished = in("Warranty.dat.unfinished");
 };
 
 TEST_F(RecordFileTest, AFileIsCompleteIfItHasThePromisedLines) {
@@ -75,7 +78,7 @@ TEST_F(RecordFileTest, CountsTheRecordsOfAnIncompleteFile) {
 
 TEST_F(RecordFileTest, AnIncompleteFileIsRestoredFromTheSavedCopy) {
     writeFile(path, records({"W1"}));
-    file.prepare();
+    prepare();
     writeFile(path, "2\nW1\n");
     EXPECT_THAT(file.recover(), AllOf(HasSubstr("Warranty.dat was incomplete (records promised: 2, present: 0)"),
                                       HasSubstr("restored from the saved copy of 20")));
@@ -87,7 +90,7 @@ TEST_F(RecordFileTest, AnIncompleteFileIsRestoredFromTheSavedCopy) {
 TEST_F(RecordFileTest, ACompleteFileIsReplacedByTheSavedCopyOnRequest) {
     EXPECT_THAT(file.restoreSaved(), IsEmpty()) << "there is no copy";
     writeFile(path, records({"W1"}));
-    file.prepare();
+    prepare();
     writeFile(path, records({"W2"}));
     EXPECT_THAT(file.defect(), IsEmpty());
     EXPECT_THAT(file.restoreSaved(), HasSubstr("restored from the saved copy of 20"));
@@ -99,16 +102,16 @@ TEST_F(RecordFileTest, ReplacedRecordsAreInTheSavedCopyUntilTheNextChange) {
     writeFile(path, records({"W1"}));
     file.replace(records({"W2"}));
     EXPECT_EQ(readFile(path), records({"W2"}));
-    EXPECT_EQ(readFile(saved), records({"W1"}) + savedLine);
+    EXPECT_EQ(file.savedCopy().content, records({"W1"}));
     EXPECT_THAT(file.recover(), IsEmpty());
-    EXPECT_EQ(file.prepare(), records({"W2"}));
-    EXPECT_EQ(readFile(saved), records({"W2"}) + savedLine);
+    EXPECT_EQ(prepare(), records({"W2"}));
+    EXPECT_EQ(file.savedCopy().content, records({"W2"}));
 }
 
 TEST_F(RecordFileTest, AMissingOrEmptyFileIsRestored) {
     for (const bool isEmpty : {false, true}) {
         writeFile(path, records({"W1"}));
-        file.prepare();
+        prepare();
         fs::remove(path);
         if (isEmpty) {
             writeFile(path, "");
@@ -121,18 +124,18 @@ TEST_F(RecordFileTest, AMissingOrEmptyFileIsRestored) {
 
 TEST_F(RecordFileTest, ACompleteFileWinsOverANewerSavedCopy) {
     writeFile(path, records({"W1"}));
-    file.prepare();
+    prepare();
     writeFile(path, records({"by_hand"}));
     fs::last_write_time(path, fs::file_time_type::clock::now() - std::chrono::hours(1));
     EXPECT_THAT(file.recover(), IsEmpty());
     EXPECT_EQ(readFile(path), records({"by_hand"}));
-    file.prepare();
-    EXPECT_EQ(readFile(saved), records({"by_hand"}) + savedLine);
+    prepare();
+    EXPECT_EQ(file.savedCopy().content, records({"by_hand"}));
 }
 
 TEST_F(RecordFileTest, AnOldSavedCopyIsUsedAndItsTimeIsLogged) {
     writeFile(path, records({"W1"}));
-    file.prepare();
+    prepare();
     fs::last_write_time(saved, fs::file_time_type::clock::now() - std::chrono::hours(24 * 365 * 3));
     writeFile(path, "");
     const std::string message = file.recover();
@@ -147,8 +150,8 @@ TEST_F(RecordFileTest, ASavedCopyOfAnotherClassIsNotUsed) {
         content += "1\n";
     }
     writeFile(in("Lease.dat"), content);
-    leases.prepare();
-    fs::copy_file(in("Lease.dat.saved"), saved);
+    leases.prepare(content, false);
+    fs::copy_file(in("Lease.dat.saved1"), saved);
     writeFile(path, "2\nW1\n");
     EXPECT_THAT(file.recover(), HasSubstr("no saved copy"));
     EXPECT_EQ(readFile(path), "2\nW1\n");
@@ -156,7 +159,7 @@ TEST_F(RecordFileTest, ASavedCopyOfAnotherClassIsNotUsed) {
 
 TEST_F(RecordFileTest, ASavedCopyThatIsCutIsNotUsed) {
     writeFile(path, records({"W1", "W2"}));
-    file.prepare();
+    prepare();
     const std::string complete = readFile(saved);
     writeFile(path, "2\n");
     for (std::size_t length = 0; length < complete.size(); ++length) {
@@ -172,6 +175,48 @@ TEST_F(RecordFileTest, WithoutSavedCopyTheIncompleteFileStaysAndIsKept) {
     EXPECT_EQ(readFile(damaged), readFile(path));
 }
 
+TEST_F(RecordFileTest, TheOlderCopyIsOverwrittenAndTheNewerOneIsUsed) {
+    writeFile(path, records({"W1"}));
+    prepare();
+    std::string newest = records({"W1"});
+    for (const char* identifier : {"W2", "W3", "W4"}) {
+        const std::string before = newest;
+        newest = records({identifier});
+        writeFile(path, newest);
+        file.commit(newest);
+        EXPECT_EQ(file.savedCopy().content, newest);
+        const fs::path used = file.savedCopy().path;
+        const std::string complete = readFile(used);
+        for (std::size_t length = 0; length < complete.size(); ++length) {
+            writeFile(used, complete.substr(0, length));
+            EXPECT_EQ(file.savedCopy().content, before) << length;
+        }
+        writeFile(used, std::string(complete).replace(3, 1, 1, '\0'));
+        EXPECT_EQ(file.savedCopy().content, before) << "it has a hole";
+        writeFile(used, complete);
+    }
+}
+
+TEST_F(RecordFileTest, AnEmptyFileWithoutSavedCopyHasNoRecords) {
+    writeFile(path, "");
+    EXPECT_THAT(file.recover(), IsEmpty());
+    EXPECT_FALSE(fs::exists(damaged));
+    EXPECT_EQ(prepare(), "0\n");
+}
+
+TEST_F(RecordFileTest, TheTargetOfASymbolicLinkIsProtected) {
+    const testsupport::TempDirectory other;
+    const fs::path target = other.path() / "records";
+    writeFile(target, records({"W1"}));
+    fs::create_symlink(target, path);
+    const RecordFile linked = recordFileIn(directory.withSlash(), "Warranty.dat");
+    linked.prepare(records({"W1"}), false);
+    writeFile(path, "2\n");
+    EXPECT_THAT(linked.recover(), HasSubstr("It was restored"));
+    EXPECT_TRUE(fs::is_symlink(path));
+    EXPECT_EQ(readFile(target), records({"W1"}));
+}
+
 TEST_F(RecordFileTest, WithoutAnyFileThereIsNothingToRecover) {
     EXPECT_THAT(file.recover(), IsEmpty());
     EXPECT_TRUE(fs::is_empty(directory.path()));
@@ -179,23 +224,21 @@ TEST_F(RecordFileTest, WithoutAnyFileThereIsNothingToRecover) {
 
 TEST_F(RecordFileTest, AnUnfinishedChangeIsNotTakenForAnAnsweredOne) {
     writeFile(path, records({"W1"}));
-    file.prepare();
-    file.markUnfinished();
+    prepare(true);
     writeFile(path, records({"W1", "W2"}));
+    EXPECT_TRUE(file.needsRecovery());
     EXPECT_THAT(file.recover(), HasSubstr("held an unfinished change"));
     EXPECT_EQ(readFile(path), records({"W1"}));
-    EXPECT_FALSE(fs::exists(unfinished));
+    EXPECT_THAT(file.recover(), IsEmpty()) << "it is finished now";
 }
 
 TEST_F(RecordFileTest, ACommittedChangeIsSavedAndFinished) {
     writeFile(path, records({"W1"}));
-    file.prepare();
-    file.markUnfinished();
+    prepare(true);
     writeFile(path, records({"W1", "W2"}));
     file.commit(records({"W1", "W2"}));
     EXPECT_THAT(file.recover(), IsEmpty());
-    EXPECT_EQ(readFile(saved), records({"W1", "W2"}) + savedLine);
-    EXPECT_FALSE(fs::exists(unfinished));
+    EXPECT_EQ(file.savedCopy().content, records({"W1", "W2"}));
 }
 
 TEST_F(RecordFileTest, AChangeIsRolledBackWhateverTheSavedCopyIs) {
@@ -203,21 +246,22 @@ TEST_F(RecordFileTest, AChangeIsRolledBackWhateverTheSavedCopyIs) {
     const std::string after = records({"W1", "W2"});
     for (const bool isCommitted : {false, true}) {
         writeFile(path, before);
-        file.prepare();
+        prepare();
         writeFile(path, after);
         if (isCommitted) {
             file.commit(after);
         }
         file.restore(before);
         EXPECT_EQ(readFile(path), before);
-        EXPECT_FALSE(fs::exists(saved)) << "it became the file";
+        EXPECT_THAT(file.recover(), IsEmpty());
+        EXPECT_FALSE(fs::exists(saved) || fs::exists(second)) << "one became the file, the other one is old";
     }
 }
 
 TEST_F(RecordFileTest, TheSavedCopyHasTheModeOfTheFile) {
     writeFile(path, records({"W1"}));
     fs::permissions(path, fs::perms::owner_read | fs::perms::owner_write);
-    file.prepare();
+    prepare();
     EXPECT_EQ(fs::status(saved).permissions(), fs::perms::owner_read | fs::perms::owner_write);
 }
 

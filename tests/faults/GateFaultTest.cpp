@@ -33,7 +33,7 @@ protected:
 
     /** A restored file may have the last line of its saved copy. */
     static bool isComplete(const std::string& content) {
-        const std::string records = content.substr(0, content.find("saved copy of " + file()));
+        const std::string records = content.substr(0, content.find("saved copy "));
         return file() == assetFile ||
                stateOf(records, file() == leaseFile ? linesOfLease : linesOfWarranty) == FileState::complete;
     }

@@ -24,7 +24,7 @@ protected:
         FileContents files = environment.filesAtFirst();
         const std::string complete = leaseRecords(records);
         files[leaseFile] = complete.substr(0, complete.size() / 2);
-        files[std::string(leaseFile) + ".saved"] = complete + "saved copy of Lease.dat\n";
+        files[std::string(leaseFile) + ".saved1"] = complete + "saved copy 1 of Lease.dat\n";
         environment.restart(files);
     }
 

@@ -4,8 +4,8 @@
 #include <unistd.h>
 
 #include <cstdlib>
-#include <fstream>
 #include <regex>
+#include <set>
 
 // Recovery of record files before the provider reads them.
 
@@ -68,8 +68,7 @@ TEST_F(RecoveryTest, AnIncompleteFileIsRestoredAndTheRestorationIsLogged) {
         EXPECT_THAT(loggedErrors(), HasSubstr("It was restored from the saved copy of 20"));
         unload();
         EXPECT_EQ(readFile(dataFile("Lease.dat")), complete);
-        fs::copy_file(dataFile("Lease.dat"), dataFile("Lease.dat.saved"), fs::copy_options::overwrite_existing);
-        std::ofstream(dataFile("Lease.dat.saved"), std::ios::app) << "saved copy of Lease.dat\n";
+        writeFile(dataFile("Lease.dat.saved1"), complete + "saved copy 1 of Lease.dat\n");
     }
 }
 
@@ -100,7 +99,8 @@ TEST_F(RecoveryTest, WithoutSavedCopyTheFileIsKeptAndItsCountsAreLogged) {
     unload();
     const std::string complete = readFile(dataFile("Lease.dat"));
     const std::string cut = complete.substr(0, complete.size() / 2 + 5);
-    fs::remove(dataFile("Lease.dat.saved"));
+    fs::remove(dataFile("Lease.dat.saved1"));
+    fs::remove(dataFile("Lease.dat.saved2"));
     writeFile(dataFile("Lease.dat"), cut);
     agentEnvironment::forgetLog();
     gate().instanceMI();
@@ -121,6 +121,37 @@ TEST_F(RecoveryTest, AnUnwritableDirectoryRefusesChangesAndIsRead) {
     }
     EXPECT_EQ(readFile(dataFile("Lease.dat")), complete);
     EXPECT_THAT(create("L2"), isAnswered(1));
+}
+
+/** Returns the names in the data directory. */
+std::set<std::string> namesInDirectory() {
+    std::set<std::string> names;
+    for (const auto& entry : fs::directory_iterator(agentEnvironment::dataDirectory())) {
+        names.insert(entry.path().filename());
+    }
+    return names;
+}
+
+TEST_F(RecoveryTest, AProcessThatMustNotWriteReadsWithoutLockAndCopies) {
+    for (const bool hasOwnerFile : {true, false}) {
+        create("L1");
+        unload();
+        fs::permissions(dataFile("Lease.dat"), fs::perms(0644));
+        if (!hasOwnerFile) {
+            fs::remove(dataFile("owner"));
+        }
+        const std::set<std::string> before = namesInDirectory();
+        gate();
+        {
+            const UnwritableDirectory unwritable(agentEnvironment::dataDirectory());
+            EXPECT_THAT(identifiers(), ElementsAre("L1"));
+            EXPECT_THAT(create("L2"), isRefused(CMPI_RC_ERR_FAILED, "cannot be changed by this process"));
+        }
+        EXPECT_EQ(namesInDirectory(), before);
+        EXPECT_THAT(create("L2"), isAnswered(1)) << "it becomes the owner";
+        EXPECT_THAT(remove("L1"), isDone());
+        EXPECT_THAT(remove("L2"), isDone());
+    }
 }
 
 }  // namespace

@@ -178,6 +178,21 @@ TEST_F(StorageTest, RollingBackNeedsNoDiskSpace) {
     EXPECT_EQ(valueIn(instanceOf("L1"), "LeaseTerm"), "0");
 }
 
+TEST_F(StorageTest, AProviderThatCannotBeLoadedAgainAnswersNothing) {
+    create("L1", {named("Lessor", text("ACME"))});
+    void* const other = dlopen(PROVIDER_LIBRARY, RTLD_NOW);
+    ASSERT_NE(other, nullptr);
+    {
+        const FullDisk disk(10);
+        EXPECT_THAT(modify("L1", {named("LeaseTerm", uint32(1))}), isRefused(CMPI_RC_ERR_FAILED, "disk may be full"));
+    }
+    EXPECT_THAT(modify("L1", {named("Lessor", text("Other"))}),
+                isRefused(CMPI_RC_ERR_FAILED, "also loaded without the gate"));
+    dlclose(other);
+    EXPECT_EQ(valueIn(instanceOf("L1"), "LeaseTerm"), "0");
+    EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "ACME");
+}
+
 TEST_F(StorageTest, AFileThatWasNotWrittenIsReported) {
     create("L1", {named("Lessor", text("ACME"))});
     const std::string stored = readFile(dataFile("Lease.dat"));
