@@ -74,7 +74,8 @@ bool hasRoom(const std::string& directory, std::size_t growth) {
 /** Whether a line of a record file is the identifier. */
 bool hasRecord(const std::string& content, std::string identifier) {
     std::replace(identifier.begin(), identifier.end(), ' ', '_');
-    return ('\n' + content).find('\n' + identifier + '\n') != std::string::npos;
+    const bool isLine = identifier.find('\n') == std::string::npos;
+    return isLine && ('\n' + content).find('\n' + identifier + '\n') != std::string::npos;
 }
 
 /** Calls a function, and reports the errors of files to the client. */
