@@ -94,7 +94,7 @@ void DataFile::requireWritable(std::size_t growth) const {
     const std::string path = pathOf(*this);
     const std::string directory = KO::PlatformUtilities::getKelsaDataDir();
     requireWritableFile(path);
-    // The saved copy, and a property file, are replaced by new files.
+    // A rollback and the change of a property file replace the file.
     if (access(directory.c_str(), W_OK | X_OK) != 0) {
         failToStore(path, "the data directory " + directory + ": " + reasonOf(errno));
     }
