@@ -62,7 +62,7 @@ public:
         if (!gate || content != wanted) {
             unload();
             writeRows(directory.data() / Row::fileName, makeRows<Row>(size));
-            gate.emplace(ProviderEntry::ofGate(), objectManager);  // first, since it finds its provider by name
+            gate.emplace(ProviderEntry::ofGate(), objectManager);
             provider.emplace(ProviderEntry::ofCopy(directory.data()), objectManager);
             content = wanted;
         }

@@ -112,8 +112,9 @@ function(law_install_overrides component name)
 endfunction()
 
 law_package(provider lease-warranty-provider
-    DOCUMENTS architecture.md architecture.svg classes.md data-files.md gate.md lease-warranty-register.md log-records.md
-        messages.md object-managers.md performance.md performance-figures.md performance.svg security.md ../README.md
+    DOCUMENTS architecture.md architecture.svg classes.md data-files.md gate.md lease-warranty-data.md
+        lease-warranty-register.md log-records.md messages.md object-managers.md performance.md
+        performance-figures.md performance.svg security.md ../README.md
     DEPENDS "ostrel-reference-agent (>= ${PROJECT_VERSION}) | ostrel-agent"
     DESCRIPTION "CMPI provider for the leases and warranties of a computer
 A library that a CIM object manager (SFCB, OpenPegasus) loads, and that
@@ -121,8 +122,9 @@ serves the leases and warranties under which a computer is held, the
 computer's asset identification and the identity of its management agent.
 
 The package also contains a gate, which serializes requests and follows the
-CIM standard, and the command lease-warranty-register, which registers the
-classes with the object manager.")
+CIM standard, the command lease-warranty-register, which registers the
+classes with the object manager, and the command lease-warranty-data, which
+checks, restores, exports and imports the data.")
 # Needed by manager-test.
 set(CPACK_DEBIAN_PROVIDER_PACKAGE_SUGGESTS "cimhost, python3, sblim-wbemcli")
 

@@ -6,28 +6,9 @@ namespace KO::LeaseWarrantyProvider {
 
 std::string loggerLeaseBase = LoggerNames::loggerName(LoggerNames::provider);
 
-using Property = Properties::Lease;
-
 const TraceSource LeaseStoreTraits::traceSource{loggerLeaseBase, "LeaseBase.cpp"};
 
 const RecordStoreNames LeaseStoreTraits::names{"Lease"};
-
-/** In file order. */
-const std::array<RecordField<LeaseUnit, Property>, 13> LeaseStoreTraits::fields{{
-    {Property::InstanceID, &LeaseUnit::InstanceID, TextForm::identifier},
-    {Property::Lessor, &LeaseUnit::Lessor},
-    {Property::BaseTermCommencementDate, &LeaseUnit::BaseTermCommencementDate, TextForm::date},
-    {Property::LeaseTerm, &LeaseUnit::LeaseTerm},
-    {Property::EarlyTerminationOption, &LeaseUnit::EarlyTerminationOption},
-    {Property::FixedPricePurchaseOption, &LeaseUnit::FixedPricePurchaseOption},
-    {Property::RenewalOption, &LeaseUnit::RenewalOption},
-    {Property::BargainRenewalOption, &LeaseUnit::BargainRenewalOption},
-    {Property::BaseRent, &LeaseUnit::BaseRent},
-    {Property::FairMarketRental, &LeaseUnit::FairMarketRental},
-    {Property::FairMarketValue, &LeaseUnit::FairMarketValue},
-    {Property::TerminationValue, &LeaseUnit::TerminationValue},
-    {Property::NetMonthlyLeaseRateFactor, &LeaseUnit::NetMonthlyLeaseRateFactor},
-}};
 
 template class RecordTrace<LeaseStoreTraits>;
 template class RecordCache<LeaseStoreTraits>;

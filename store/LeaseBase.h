@@ -73,7 +73,22 @@ struct LeaseStoreTraits {
 
     static const TraceSource traceSource;
     static const RecordStoreNames names;
-    static const std::array<RecordField<Unit, Property>, 13> fields;
+    /** In file order. */
+    static constexpr std::array<RecordField<Unit, Property>, 13> fields{{
+        {Property::InstanceID, &LeaseUnit::InstanceID, TextForm::identifier},
+        {Property::Lessor, &LeaseUnit::Lessor},
+        {Property::BaseTermCommencementDate, &LeaseUnit::BaseTermCommencementDate, TextForm::date},
+        {Property::LeaseTerm, &LeaseUnit::LeaseTerm},
+        {Property::EarlyTerminationOption, &LeaseUnit::EarlyTerminationOption},
+        {Property::FixedPricePurchaseOption, &LeaseUnit::FixedPricePurchaseOption},
+        {Property::RenewalOption, &LeaseUnit::RenewalOption},
+        {Property::BargainRenewalOption, &LeaseUnit::BargainRenewalOption},
+        {Property::BaseRent, &LeaseUnit::BaseRent},
+        {Property::FairMarketRental, &LeaseUnit::FairMarketRental},
+        {Property::FairMarketValue, &LeaseUnit::FairMarketValue},
+        {Property::TerminationValue, &LeaseUnit::TerminationValue},
+        {Property::NetMonthlyLeaseRateFactor, &LeaseUnit::NetMonthlyLeaseRateFactor},
+    }};
 };
 
 /** The process-wide lease table, stored in Lease.dat. */

@@ -6,19 +6,9 @@ namespace KO::LeaseWarrantyProvider {
 
 std::string loggerWarrantyBase = LoggerNames::loggerName(LoggerNames::provider);
 
-using Property = Properties::Warranty;
-
 const TraceSource WarrantyStoreTraits::traceSource{loggerWarrantyBase, "WarrantyBase.cpp"};
 
 const RecordStoreNames WarrantyStoreTraits::names{"Warranty"};
-
-/** In file order. */
-const std::array<RecordField<WarrantyUnit, Property>, 4> WarrantyStoreTraits::fields{{
-    {Property::InstanceID, &WarrantyUnit::InstanceID, TextForm::identifier},
-    {Property::Warrantor, &WarrantyUnit::Warrantor},
-    {Property::CommencementDate, &WarrantyUnit::CommencementDate, TextForm::date},
-    {Property::Duration, &WarrantyUnit::Duration},
-}};
 
 template class RecordTrace<WarrantyStoreTraits>;
 template class RecordCache<WarrantyStoreTraits>;

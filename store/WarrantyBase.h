@@ -55,7 +55,13 @@ struct WarrantyStoreTraits {
 
     static const TraceSource traceSource;
     static const RecordStoreNames names;
-    static const std::array<RecordField<Unit, Property>, 4> fields;
+    /** In file order. */
+    static constexpr std::array<RecordField<Unit, Property>, 4> fields{{
+        {Property::InstanceID, &WarrantyUnit::InstanceID, TextForm::identifier},
+        {Property::Warrantor, &WarrantyUnit::Warrantor},
+        {Property::CommencementDate, &WarrantyUnit::CommencementDate, TextForm::date},
+        {Property::Duration, &WarrantyUnit::Duration},
+    }};
 };
 
 /** The process-wide warranty table, stored in Warranty.dat. */

@@ -22,6 +22,10 @@ struct ManagerGone {};
     throw Failure{rc, std::move(message)};
 }
 
+/** Writes an error to the log and trace of the agent. If the process is out of memory, nothing is written. */
+void logError(const std::string& message, const char* function = __builtin_FUNCTION(),
+              const char* file = __builtin_FILE(), int line = __builtin_LINE());
+
 /** Sets the status of a function that the gate implements for others. They may pass null. */
 inline void setStatus(CMPIStatus* rc, CMPIrc code) {
     if (rc != nullptr) {

@@ -1,9 +1,6 @@
 #include "Operations.h"
 
-#include <RZLog/RZLogger.h>
-
 #include <algorithm>
-#include <exception>
 
 // All association requests return the same facts: the object manager knows the computers, and the provider knows which
 // lease or warranty belongs to each.
@@ -25,19 +22,6 @@ struct AssociationPair {
 };
 
 using Pairs = std::vector<AssociationPair>;
-
-/** Writes an error to the log and trace of the agent. If the process is out of memory, nothing is written. */
-void logError(const std::string& message, const char* function = __builtin_FUNCTION(), int line = __builtin_LINE()) {
-    constexpr const char* logger = "Tarvik.LeaseAndWarrantyGate";
-    constexpr const char* file = "Associations.cpp";
-    constexpr int errorLevel = 3000;
-    try {
-        RZLog::RZLogger::logLevelMessage(function, file, line, logger, errorLevel, nullptr, 0, 0, message);
-        RZLog::RZLogger::traceLevelMessage(function, file, line, logger, errorLevel, nullptr, 0, 0, message);
-    } catch (const std::exception&) {
-        // The client still receives the message.
-    }
-}
 
 /** Fails unless the computers could be enumerated. Logs the reason, too, since clients often drop it. */
 void requireEnumerated(bool isDone, const CMPIStatus& status) {

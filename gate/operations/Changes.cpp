@@ -17,7 +17,7 @@ const DataFile& fileOf(const Class& owner) {
 /** The same for creations and deletions, which need a record file. */
 const DataFile& recordFileOf(const Class& owner) {
     const DataFile* file = dataFileOf(owner);
-    if (file == nullptr || !file->hasRecords()) {
+    if (file == nullptr || !file->hasRecords) {
         fail(CMPI_RC_ERR_NOT_SUPPORTED,
              std::string("Instances of ") + owner.name + " can be neither created nor deleted.");
     }
@@ -61,7 +61,7 @@ void createInstance(const Request& request, const CMPIInstance* instance) {
     const Class& requested = request.requestedClass();
     const DataFile& file = recordFileOf(requested);
     requireInstance(instance);
-    ProviderSession session(request);
+    ProviderSession session(request, ProviderSession::Access::change);
     const Property& key = *findProperty(requested, "InstanceID");
     const std::string identifier = identifierOf(request.path, instance, key, requested);
     requireKnownProperties(requested, instance);
@@ -73,7 +73,7 @@ void createInstance(const Request& request, const CMPIInstance* instance) {
     CMPIObjectPath* created = makePath(session.broker(), nameSpaceOf(request.path), requested.name);
     addKey(created, key.name, identifier);
     const std::vector<const CMPIObjectPath*> answer{created};
-    Transaction(session, requested, file, path).create(given, [&] { request.give(answer); });
+    Transaction(session, requested, file, path).create(identifier, given, [&] { request.give(answer); });
 }
 
 void modifyInstance(const Request& request, const CMPIInstance* instance, const char** properties) {
@@ -82,7 +82,7 @@ void modifyInstance(const Request& request, const CMPIInstance* instance, const 
     requireInstance(instance);
     const PropertyList list(properties, requested);
     list.requireKnown();
-    ProviderSession session(request);
+    ProviderSession session(request, ProviderSession::Access::change);
     const LocalObjectPath path = localPath(request.path, requested);
     requireKnownProperties(requested, instance);
     const Values given = valuesOf(instance, requested, [&](const Property& property) { return list.has(property); });
@@ -96,9 +96,10 @@ void modifyInstance(const Request& request, const CMPIInstance* instance, const 
 void deleteInstance(const Request& request) {
     const Class& requested = request.requestedClass();
     const DataFile& file = recordFileOf(requested);
-    ProviderSession session(request);
+    ProviderSession session(request, ProviderSession::Access::change);
     const LocalObjectPath path = localPath(request.path, requested);
-    Transaction(session, requested, file, path).remove(session.get(path, requested));
+    session.get(path, requested);  // there must be one
+    Transaction(session, requested, file, path).remove();
 }
 
 }  // namespace gate

@@ -1,14 +1,15 @@
 #include "ProviderConnection.h"
 
+#include "durable/DataDirectory.h"
+
+#include "KO/PlatformUtilities.h"
+
+#include <cxxabi.h>
 #include <dlfcn.h>
 
 #include <chrono>
 #include <exception>
-
-extern "C" {
-CMPIInstanceMI* LeaseAndWarrantyProvider_Create_InstanceMI(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
-CMPIAssociationMI* LeaseAndWarrantyProvider_Create_AssociationMI(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
-}
+#include <thread>
 
 namespace gate {
 
@@ -20,10 +21,18 @@ namespace {
  */
 constexpr std::chrono::seconds drainTimeout{5};
 
-/** Destroyed before the provider's static objects, so that no request is running when these are destroyed. */
-const struct ShutdownAtExit {
-    ~ShutdownAtExit() { theRequestLock.close(drainTimeout, RequestLock::Closing::permanent); }
-} shutdownAtExit;
+/** How long a request waits for another owner of the data directory, and for up-calls of the provider. */
+constexpr std::chrono::seconds waitTimeout{5};
+constexpr std::chrono::milliseconds pollInterval{10};
+
+/** Releases the lock while the condition holds, but not much longer than the timeout. */
+template <class Condition>
+void waitWhile(LockGuard& guard, Condition condition) {
+    const auto end = std::chrono::steady_clock::now() + waitTimeout;
+    while (condition() && std::chrono::steady_clock::now() < end) {
+        guard.releaseFor([] { std::this_thread::sleep_for(pollInterval); });
+    }
+}
 
 /** Keeps this library and its dependencies in the process, for a request that is still running in them. */
 void stayLoaded() {
@@ -33,9 +42,43 @@ void stayLoaded() {
     }
 }
 
+/** The agent's data directory. */
+durable::DataDirectory theDirectory{[] { return std::string(KO::PlatformUtilities::getKelsaDataDir()); },
+                                    [](const std::string& message) { logError(message); }};
+
 }  // namespace
 
 ProviderConnection theConnection;
+
+namespace {
+
+/** Shuts down when this library is unloaded and when the process ends. */
+class ShutdownAtExit {
+public:
+    ~ShutdownAtExit() { abi::__cxa_finalize(this); }
+
+    /** Called after the provider was loaded: then no request is running when its static objects are destroyed. */
+    void registerAgain() {
+        isRegistering = true;
+        abi::__cxa_finalize(this);  // calls and forgets the earlier registration
+        isRegistering = false;
+        abi::__cxa_atexit(
+            [](void* self) {
+                if (!static_cast<ShutdownAtExit*>(self)->isRegistering) {
+                    theRequestLock.close(drainTimeout, RequestLock::Closing::permanent,
+                                         [] { theConnection.endProcess(); });
+                }
+            },
+            this, this);
+    }
+
+private:
+    bool isRegistering = false;
+};
+
+ShutdownAtExit shutdownAtExit;  // destroyed before the objects above
+
+}  // namespace
 
 void ProviderConnection::connect(const CMPIBroker* manager) {
     const bool isOpen = theRequestLock.open();
@@ -47,15 +90,80 @@ void ProviderConnection::connect(const CMPIBroker* manager) {
         return;
     }
     const LockGuard guard;
-    wrapped.emplace(manager, WrappedBroker::Lock{[] { theRequestLock.release(); }, [] { theRequestLock.reacquire(); }});
-    CMPIStatus status{CMPI_RC_OK, nullptr};
-    instances = LeaseAndWarrantyProvider_Create_InstanceMI(wrapped->handle(), nullptr, &status);
-    associations = LeaseAndWarrantyProvider_Create_AssociationMI(wrapped->handle(), nullptr, &status);
-    const bool isConnected = instances != nullptr && associations != nullptr;
-    set(isConnected ? manager : nullptr);
-    if (!isConnected) {
+    wrapped.emplace(manager,
+                    WrappedBroker::Lock{[] { theConnection.beginUpCall(); }, [] { theConnection.endUpCall(); }});
+    try {
+        library.isLoaded() ? createInterfaces() : load();
+    } catch (...) {
+        set(nullptr);
+        throw;
+    }
+    set(manager);
+}
+
+void ProviderConnection::requireOwner(LockGuard& guard) {
+    durable::DataDirectory::Ownership ownership{};
+    waitWhile(guard, [&] {
+        ownership = theDirectory.acquire();
+        return ownership.isOtherProcess;
+    });
+    if (!ownership.isOwner) {
+        fail(CMPI_RC_ERR_FAILED, ownership.reason);
+    }
+}
+
+bool ProviderConnection::needsLoading() const {
+    return isOutdated || !library.isLoaded() || theDirectory.isOutdated();
+}
+
+void ProviderConnection::requireCurrent(LockGuard& guard) {
+    waitWhile(guard, [&] { return needsLoading() && upCalls != 0; });
+    if (needsLoading()) {
+        if (upCalls != 0) {
+            fail(CMPI_RC_ERR_FAILED,
+                 "The provider waits for the object manager and cannot be loaded again. Try again.");
+        }
+        load();
+    }
+}
+
+/** Loads the provider, which reads its files. Unloads it first if it is loaded. */
+void ProviderConnection::load() {
+    constexpr int attempts = 10;
+    isOutdated = true;
+    for (int attempt = 0; attempt == 0 || (theDirectory.hasChanged() && attempt < attempts); ++attempt) {
+        unload();
+        theDirectory.open();
+        library.load();
+    }
+    shutdownAtExit.registerAgain();
+    createInterfaces();
+    isOutdated = false;
+    verified = 0;
+}
+
+void ProviderConnection::unload() {
+    instances = nullptr;
+    associations = nullptr;
+    library.unload();
+}
+
+void ProviderConnection::createInterfaces() {
+    instances = library.createInstanceMI(wrapped->handle());
+    associations = library.createAssociationMI(wrapped->handle());
+    if (instances == nullptr || associations == nullptr) {
         fail(CMPI_RC_ERR_FAILED, "The provider did not return its interfaces.");
     }
+}
+
+void ProviderConnection::beginUpCall() {
+    ++upCalls;
+    theRequestLock.release();
+}
+
+void ProviderConnection::endUpCall() {
+    theRequestLock.reacquire();
+    --upCalls;
 }
 
 const CMPIBroker* ProviderConnection::broker() const {
@@ -93,11 +201,19 @@ void ProviderConnection::set(const CMPIBroker* manager) {
 }
 
 void ProviderConnection::endProvider(const CMPIContext* context) {
-    if (broker() != nullptr) {
+    if (broker() != nullptr && instances != nullptr && associations != nullptr) {
         instances->ft->cleanup(instances, context, 1);
         associations->ft->cleanup(associations, context, 1);
     }
     set(nullptr);
+    endProcess();
+}
+
+void ProviderConnection::endProcess() {
+    if (upCalls == 0) {
+        unload();
+        theDirectory.close();
+    }
 }
 
 }  // namespace gate

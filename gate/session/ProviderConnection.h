@@ -1,14 +1,17 @@
 #pragma once
 
+#include "ProviderLibrary.h"
 #include "RequestLock.h"
+#include "gate/cmpi/Schema.h"
 #include "gate/cmpi/WrappedBroker.h"
 
+#include <cstddef>
 #include <mutex>
 #include <optional>
 
 namespace gate {
 
-/** The process's only connection between the provider and an object manager. */
+/** The process's only connection between the provider and an object manager. Loads and unloads the provider. */
 class ProviderConnection {
 public:
     constexpr ProviderConnection() = default;
@@ -23,6 +26,9 @@ public:
      */
     void connect(const CMPIBroker* manager);
 
+    /** Unloads the provider when the process ends. */
+    void endProcess();
+
     /** The object manager's broker; null if there is none. Waits for no request. */
     const CMPIBroker* broker() const;
 
@@ -34,13 +40,44 @@ public:
     WrappedBroker& wrappedBroker() { return *wrapped; }
     CMPIInstanceMI* instanceInterface() const { return instances; }
     CMPIAssociationMI* associationInterface() const { return associations; }
+
+    /**
+     * Ensures that this process owns the data directory, for a change. Releases the lock until another owner ends.
+     * Fails with CMPI_RC_ERR_FAILED if that takes too long.
+     */
+    void requireOwner(LockGuard& guard);
+
+    /** Marks the provider's tables as different from its files, so that requireCurrent() loads it again. */
+    void setOutdated() { isOutdated = true; }
+
+    /**
+     * Loads the provider if it is not loaded or outdated. Releases the lock until no other request is in an up-call of
+     * the provider, since it cannot be unloaded before. Fails with CMPI_RC_ERR_FAILED if that takes too long.
+     */
+    void requireCurrent(LockGuard& guard);
+
+    /** @name Whether a class's table has been compared with its file since the provider was loaded */
+    bool isVerified(const Class& owner) const { return (verified & bitOf(owner)) != 0; }
+    void setVerified(const Class& owner) { verified |= bitOf(owner); }
     ///@}
 
 private:
+    static std::size_t bitOf(const Class& owner) { return std::size_t{1} << (&owner - Classes().begin()); }
+
+    bool needsLoading() const;
+    void load();
+    void unload();
+    void createInterfaces();
+    void beginUpCall();
+    void endUpCall();
     bool isConnectedTo(const CMPIBroker* manager) const;
     void set(const CMPIBroker* manager);
     void endProvider(const CMPIContext* context);
 
+    ProviderLibrary library{};
+    bool isOutdated = false;
+    std::size_t verified = 0;  ///< a bit of each class
+    std::size_t upCalls = 0;   ///< requests in the provider that have released the lock
     std::optional<WrappedBroker> wrapped{};
     CMPIInstanceMI* instances = nullptr;
     CMPIAssociationMI* associations = nullptr;

@@ -84,8 +84,12 @@ void Request::give(const std::vector<const CMPIObjectPath*>& paths) const {
     giveAll<&CMPIResultFT::returnObjectPath>(*this, paths);
 }
 
-ProviderSession::ProviderSession(const Request& itsRequest) : request(itsRequest) {
+ProviderSession::ProviderSession(const Request& itsRequest, Access access) : request(itsRequest) {
     request.broker();  // there must be one
+    if (access == Access::change) {
+        theConnection.requireOwner(guard);
+    }
+    theConnection.requireCurrent(guard);
 }
 
 ProviderSession::Paths ProviderSession::names(const LocalObjectPath& classPath) const {

@@ -60,7 +60,10 @@ public:
     using Paths = std::vector<const CMPIObjectPath*>;
     using Instances = std::vector<const CMPIInstance*>;
 
-    explicit ProviderSession(const Request& itsRequest);
+    enum class Access { read, change };
+
+    /** Begins the session. For a change, this process must own the data directory. */
+    explicit ProviderSession(const Request& itsRequest, Access access = Access::read);
 
     const CMPIBroker* broker() const { return request.broker(); }
 
@@ -78,10 +81,17 @@ public:
     void modify(const LocalObjectPath& path, const Values& values);
     void remove(const LocalObjectPath& path);
 
-    /** Releases the lock for a call of the object manager that may take long or lead back to the gate. */
+    /** Marks the provider's tables as wrong: it is loaded again before the next request. */
+    void setOutdated() const { theConnection.setOutdated(); }
+
+    /**
+     * Releases the lock for a call of the object manager that may take long or lead back to the gate. Another request
+     * may load the provider again meanwhile.
+     */
     template <class Work>
     void releaseFor(Work work) {
         guard.releaseFor(work);
+        theConnection.requireCurrent(guard);
     }
 
 private:

@@ -1,5 +1,8 @@
 #include "DataFile.h"
 
+#include "durable/Files.h"
+#include "durable/RecordFile.h"
+
 #include "KO/PlatformUtilities.h"
 
 #include <fcntl.h>
@@ -9,8 +12,7 @@
 
 #include <algorithm>
 #include <cerrno>
-#include <charconv>
-#include <fstream>
+#include <filesystem>
 #include <iterator>
 #include <system_error>
 
@@ -19,13 +21,17 @@ namespace gate {
 namespace {
 
 constexpr DataFile dataFiles[] = {
-    {"VELKO_Lease", "Lease.dat", 13},
-    {"VELKO_Warranty", "Warranty.dat", 4},
-    {"VELKO_AssetIDDetails", "asset.dat", 0},
+    {"VELKO_Lease", "Lease.dat", true},
+    {"VELKO_Warranty", "Warranty.dat", true},
+    {"VELKO_AssetIDDetails", "asset.dat", false},
 };
 
 std::string pathOf(const DataFile& file) {
     return std::string(KO::PlatformUtilities::getKelsaDataDir()) + file.fileName;
+}
+
+durable::RecordFile recordFileOf(const DataFile& file) {
+    return durable::recordFileIn(KO::PlatformUtilities::getKelsaDataDir(), file.fileName);
 }
 
 [[noreturn]] void failToStore(const std::string& path, const std::string& reason) {
@@ -36,14 +42,14 @@ std::string reasonOf(int error) {
     return std::generic_category().message(error);
 }
 
-/** Whether the file exists. Fails if it cannot be written or is not a regular file. */
-bool existsWritable(const std::string& path) {
+/** Fails if the file exists and cannot be written or is not a regular file. */
+void requireWritableFile(const std::string& path) {
     const int descriptor = open(path.c_str(), O_RDWR | O_CLOEXEC | O_NONBLOCK);
-    if (descriptor < 0 && errno != ENOENT) {
-        failToStore(path, reasonOf(errno));
+    if (descriptor < 0 && errno == ENOENT) {
+        return;
     }
     if (descriptor < 0) {
-        return false;
+        failToStore(path, reasonOf(errno));
     }
     struct stat status {};
     const bool isRegular = fstat(descriptor, &status) == 0 && S_ISREG(status.st_mode);
@@ -51,7 +57,6 @@ bool existsWritable(const std::string& path) {
     if (!isRegular) {
         failToStore(path, "it is not a regular file");
     }
-    return true;
 }
 
 /** Whether the file system has room for the file's growth and for a block that is partly used. */
@@ -66,34 +71,21 @@ bool hasRoom(const std::string& directory, std::size_t growth) {
     return blocks > (growth + block) / system.f_frsize;
 }
 
-bool endsWithOneLineBreak(std::string_view content) {
-    const bool hasLineBreak = !content.empty() && content.back() == '\n';
-    return hasLineBreak && (content.size() < 2 || content[content.size() - 2] != '\n');
+/** Whether a line of a record file is the identifier. */
+bool hasRecord(const std::string& content, std::string identifier) {
+    std::replace(identifier.begin(), identifier.end(), ' ', '_');
+    const bool isLine = identifier.find('\n') == std::string::npos;
+    return isLine && ('\n' + content).find('\n' + identifier + '\n') != std::string::npos;
 }
 
-std::size_t linesIn(std::string_view content) {
-    const auto ends = static_cast<std::size_t>(std::count(content.begin(), content.end(), '\n'));
-    return ends + (content.empty() || content.back() == '\n' ? 0U : 1U);
-}
-
-/** The number of records, from the head of the file. */
-std::size_t declaredIn(std::string_view content) {
-    std::size_t number = 0;
-    std::from_chars(content.data(), content.data() + content.size(), number);
-    return number;
-}
-
-/** Counts the lines that equal the wanted one, of those that begin a step. The head is not counted. */
-std::size_t countLines(std::string_view content, std::string_view wanted, std::size_t step) {
-    std::size_t found = 0;
-    std::size_t number = 0;
-    for (std::size_t begin = 0; begin < content.size(); ++number) {
-        const std::size_t end = std::min(content.find('\n', begin), content.size());
-        const bool isFirst = number > 0 && (number - 1) % step == 0;
-        found += isFirst && content.substr(begin, end - begin) == wanted ? 1U : 0U;
-        begin = end + 1;
+/** Calls a function, and reports the errors of files to the client. */
+template <class Work>
+auto onFiles(Work work) {
+    try {
+        return work();
+    } catch (const std::system_error& error) {
+        fail(CMPI_RC_ERR_FAILED, std::string("The change cannot be stored in ") + error.what() + ".");
     }
-    return found;
 }
 
 }  // namespace
@@ -101,10 +93,9 @@ std::size_t countLines(std::string_view content, std::string_view wanted, std::s
 void DataFile::requireWritable(std::size_t growth) const {
     const std::string path = pathOf(*this);
     const std::string directory = KO::PlatformUtilities::getKelsaDataDir();
-    const bool exists = existsWritable(path);
-    // A property file is replaced by a new one, which needs access to the directory.
-    const bool needsDirectory = !exists || !hasRecords();
-    if (needsDirectory && access(directory.c_str(), W_OK | X_OK) != 0) {
+    requireWritableFile(path);
+    // A rollback and the change of a property file replace the file.
+    if (access(directory.c_str(), W_OK | X_OK) != 0) {
         failToStore(path, "the data directory " + directory + ": " + reasonOf(errno));
     }
     if (!hasRoom(directory, growth)) {
@@ -113,47 +104,63 @@ void DataFile::requireWritable(std::size_t growth) const {
 }
 
 FileState DataFile::state() const {
-    if (!hasRecords()) {
-        return {};
-    }
     const std::string path = pathOf(*this);
     struct stat status {};
-    if (stat(path.c_str(), &status) != 0) {
-        return {};
-    }
-    FileState state{std::string(static_cast<std::size_t>(status.st_size), '\0'),
-                    status.st_mtim.tv_sec * 1000000000LL + status.st_mtim.tv_nsec};
-    std::ifstream stream(path, std::ios::binary);
-    stream.read(state.content.data(), status.st_size);  // an error sets a flag of the stream and throws nothing
-    state.content.resize(static_cast<std::size_t>(stream.gcount()));
-    return state;
+    stat(path.c_str(), &status);
+    return onFiles([&] {
+        return FileState{durable::readFile(path).value_or(std::string()),
+                         status.st_mtim.tv_sec * 1000000000LL + status.st_mtim.tv_nsec};
+    });
 }
 
-bool DataFile::isComplete(std::string_view content) const {
-    const std::size_t records = declaredIn(content);
-    return linesIn(content) >= 1 + records * linesPerRecord && (records == 0 || endsWithOneLineBreak(content));
+bool DataFile::hasCount(std::size_t count) const {
+    return onFiles([&] {
+        const durable::RecordFile file = recordFileOf(*this);
+        const auto promised = durable::RecordFile::promisedIn(file.content().value_or(std::string()));
+        return !file.needsRecovery() && promised.value_or(0) == count;
+    });
 }
 
-std::size_t DataFile::countRecords(std::string_view content, const std::string& identifier) const {
-    if (!hasRecords()) {
-        return 0;
+FileState DataFile::begin(bool hasSteps) const {
+    FileState before = state();
+    before.restorable = before.content;
+    if (hasRecords) {
+        before.restorable = onFiles([&] { return recordFileOf(*this).prepare(before.content, hasSteps); });
     }
-    if (!isComplete(content)) {
-        failToStore(pathOf(*this), "it does not hold all records; the disk may be full");
-    }
-    std::string stored = identifier;
-    std::replace(stored.begin(), stored.end(), ' ', '_');
-    // Line breaks in stored values make record boundaries ambiguous; compare every line in that case.
-    const bool hasBoundaries = linesIn(content) == 1 + declaredIn(content) * linesPerRecord;
-    return countLines(content, stored, hasBoundaries ? linesPerRecord : 1);
+    return before;
 }
 
-std::optional<std::size_t> DataFile::countRecordsIfComplete(const std::string& identifier) const {
-    try {
-        return countRecords(state().content, identifier);
-    } catch (const Failure&) {
-        return std::nullopt;
+void DataFile::commit(const FileState& before, bool mustDiffer, const std::string* identifier) const {
+    if (!hasRecords) {
+        return;
     }
+    const FileState now = state();
+    if (mustDiffer && now == before) {
+        fail(CMPI_RC_ERR_FAILED, std::string(fileName) + " was not written.");
+    }
+    const durable::RecordFile file = recordFileOf(*this);
+    if (!file.isComplete(now.content)) {
+        failToStore(file.path(), "it does not hold all records; the disk may be full");
+    }
+    if (identifier != nullptr && !hasRecord(now.content, *identifier)) {
+        fail(CMPI_RC_ERR_FAILED, std::string(fileName) + " does not hold " + *identifier + ".");
+    }
+    onFiles([&] { file.commit(now.content); });
+}
+
+void DataFile::rollBack(const FileState& before) const {
+    if (hasRecords && before.restorable.empty()) {
+        failToStore(pathOf(*this), "it was damaged before, and there is no saved copy");
+    }
+    onFiles([&] {
+        if (hasRecords) {
+            recordFileOf(*this).restore(before.restorable);
+        } else if (!(state() == before)) {
+            const std::string path = std::filesystem::canonical(pathOf(*this));  // replaces the target of a link
+            durable::replaceFile(path, before.content, path);
+            durable::syncDirectoryOf(path);
+        }
+    });
 }
 
 const DataFile* dataFileOf(const Class& owner) {

@@ -4,49 +4,56 @@
 
 #include <cstddef>
 #include <cstdint>
-#include <optional>
 #include <string>
-#include <string_view>
 
 namespace gate {
 
-/** The content of a record file and the time of its last change. */
+/** The content of a data file and the time of its last change, which are compared. */
 struct FileState {
-    std::string content;        ///< empty if the file cannot be read, and for a property file
+    std::string content;        ///< empty if the file does not exist
     std::int64_t modified = 0;  ///< nanoseconds
+    std::string restorable{};   ///< content for rollBack(); empty if it is unknown
 
     bool operator==(const FileState& other) const { return modified == other.modified && content == other.content; }
 };
 
-/** A class's data file. The provider writes it and does not report errors, so the gate checks it around each change. */
+/**
+ * A class's data file. The provider writes it and does not report errors, so the gate checks it around each change, and
+ * keeps a copy of a record file that is always complete (durable/RecordFile.h).
+ *
+ * All functions fail with CMPI_RC_ERR_FAILED, the file and the reason.
+ */
 struct DataFile {
     const char* className;
     const char* fileName;
-    std::size_t linesPerRecord;  ///< 0 for a property file
-
-    /** Whether it is a record file, so that instances can be created and deleted. */
-    bool hasRecords() const { return linesPerRecord != 0; }
+    bool hasRecords;  ///< false for a property file, whose instances are neither created nor deleted
 
     /**
-     * Fails with CMPI_RC_ERR_FAILED and the reason if the file cannot be written now. The provider truncates a record
-     * file before it notices that the disk is full.
+     * Fails if the file cannot be written now. The provider truncates a record file before it notices that the disk is
+     * full.
      * @param growth the most bytes that the change adds
      */
     void requireWritable(std::size_t growth) const;
 
     FileState state() const;
 
-    /** Whether the content of a record file has as many lines as its count requires. */
-    bool isComplete(std::string_view content) const;
+    /** Whether the record file needs no recovery and has this number of records. */
+    bool hasCount(std::size_t count) const;
+
+    /** @name Storing a change: begin(), the provider's writing, then commit() or rollBack() */
+    ///@{
+    /** Returns the state before the change. @param hasSteps whether the change writes the file more than once */
+    FileState begin(bool hasSteps) const;
 
     /**
-     * The number of records with an identifier; 0 for a property file. Fails with CMPI_RC_ERR_FAILED if the content is
-     * not complete.
+     * Syncs the file and the saved copy. Fails if the file is incomplete, or must differ from a state but does not.
+     * @param identifier of a record that the file must have; null for none
      */
-    std::size_t countRecords(std::string_view content, const std::string& identifier) const;
+    void commit(const FileState& before, bool mustDiffer, const std::string* identifier = nullptr) const;
 
-    /** The number of records in the file as it is now; none if it is not complete. */
-    std::optional<std::size_t> countRecordsIfComplete(const std::string& identifier) const;
+    /** Restores the file to the state that begin() returned. */
+    void rollBack(const FileState& before) const;
+    ///@}
 };
 
 /** The class's file; null for a class whose instances cannot be changed. */

@@ -108,23 +108,6 @@ Values valuesToSend(const Class& owner, const CMPIInstance* current, const Value
     return values;
 }
 
-Values rollbackValues(const Class& owner, const DataFile& file, const Values& changes, const CMPIInstance* current) {
-    Values values;
-    for (const Property& property : owner) {
-        const auto value = propertyOf(current, property);
-        if (isAmong(property, changes) || (!file.hasRecords() && value && !property.isKey)) {
-            values.emplace_back(&property, storedValue(property, value.value_or(std::string(cim::noDate))));
-        }
-    }
-    return values;
-}
-
-bool equalOn(const Values& properties, const CMPIInstance* left, const CMPIInstance* right) {
-    return std::all_of(properties.begin(), properties.end(), [&](const auto& value) {
-        return isClock(*value.first) || propertyOf(left, *value.first) == propertyOf(right, *value.first);
-    });
-}
-
 bool altersFile(const DataFile& file, const CMPIInstance* current, const Values& changes) {
     return std::any_of(changes.begin(), changes.end(), [&](const auto& change) {
         const auto& [property, value] = change;

@@ -19,15 +19,6 @@ Values diff(const CMPIInstance* current, const Values& given, bool areListed);
  */
 Values valuesToSend(const Class& owner, const CMPIInstance* current, const Values& changes);
 
-/**
- * The values that reverse the changes, from the instance before them. For a property file these are all of its values:
- * a change that cannot read the file empties the others.
- */
-Values rollbackValues(const Class& owner, const DataFile& file, const Values& changes, const CMPIInstance* current);
-
-/** Whether the instances have equal values of these properties. The clock does not count. */
-bool equalOn(const Values& properties, const CMPIInstance* left, const CMPIInstance* right);
-
 /** Whether the changes are certain to alter the content of a record file. */
 bool altersFile(const DataFile& file, const CMPIInstance* current, const Values& changes);
 

@@ -41,7 +41,7 @@ const char* lossOf(const DataFile& file, const Property& property, const std::st
     if (property.type == CMPI_dateTime) {
         return value == cim::noDate || isRepresentable(file, value) ? nullptr : "it is not a valid datetime";
     }
-    if (property.type != CMPI_string || !file.hasRecords()) {
+    if (property.type != CMPI_string || !file.hasRecords) {
         return nullptr;
     }
     for (const Rule& rule : rules) {
@@ -60,7 +60,7 @@ bool refusesLossyValues() {
 }  // namespace
 
 bool isRepresentable(const DataFile& file, const std::string& dateTime) {
-    return cim::isPointInTime(dateTime) || (file.hasRecords() && cim::isInterval(dateTime));
+    return cim::isPointInTime(dateTime) || (file.hasRecords && cim::isInterval(dateTime));
 }
 
 bool survivesRoundTrip(const DataFile& file, const Property& property, const std::string& value) {

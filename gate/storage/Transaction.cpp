@@ -10,12 +10,6 @@ namespace {
 
 constexpr const char* identifierKey = "InstanceID";
 
-/** The identifier of a record; empty for another instance. */
-std::string recordIdentifier(const LocalObjectPath& path, const Class& owner) {
-    const Property* key = findProperty(owner, identifierKey);
-    return key == nullptr ? std::string() : keyOf(path.handle(), *key).value_or(std::string());
-}
-
 /** The most bytes that values take in a file. */
 std::size_t sizeOf(const Values& values) {
     std::size_t size = 0;
@@ -25,141 +19,106 @@ std::size_t sizeOf(const Values& values) {
     return size;
 }
 
-/** Whether the rollback has restored the file. The client receives the change's failure, not the rollback's. */
-template <class RollBack>
-bool succeeds(RollBack rollBack) {
-    try {
-        return rollBack();
-    } catch (...) {
-        return false;
-    }
-}
-
 }  // namespace
 
 Transaction::Transaction(ProviderSession& itsSession, const Class& itsClass, const DataFile& itsFile,
                          const LocalObjectPath& itsPath)
-    : session(itsSession),
-      owner(itsClass),
-      file(itsFile),
-      path(itsPath),
-      identifier(recordIdentifier(itsPath, itsClass)) {}
+    : session(itsSession), owner(itsClass), file(itsFile), path(itsPath) {}
 
 /**
- * Runs a change and its checks, after which it is committed. If one of them fails, rolls the change back and passes
+ * Calls `change(before)`, which makes a change, checks it and commits it. If it fails, rolls the change back and passes
  * the failure on, with a note if the file could not be restored.
- * @param rollBack returns whether the file is as before
+ * @param hasSteps whether the file is written more than once
  */
-template <class Change, class RollBack>
-void Transaction::runOrRollBack(Change change, RollBack rollBack) const {
+template <class Change>
+void Transaction::run(std::size_t growth, bool hasSteps, Change change) const {
+    file.requireWritable(growth);
+    requireTable();
+    const FileState before = file.begin(hasSteps);
     try {
-        change();
+        change(before);
     } catch (Failure& failure) {
-        if (!succeeds(rollBack)) {
-            failure.message += damageNote();
-        }
+        failure.message += rollBack(before);
         throw;
     } catch (const std::exception& exception) {
-        if (succeeds(rollBack)) {
+        const std::string note = rollBack(before);
+        if (note.empty()) {
             throw;
         }
-        fail(CMPI_RC_ERR_FAILED, std::string("The request failed: ") + exception.what() + "." + damageNote());
+        fail(CMPI_RC_ERR_FAILED, std::string("The request failed: ") + exception.what() + "." + note);
     } catch (...) {
-        succeeds(rollBack);
+        rollBack(before);
         throw;
     }
 }
 
-std::string Transaction::damageNote() const {
-    return std::string(" ") + file.fileName +
-           (file.hasRecords() ? " stays damaged until the next change succeeds."
-                              : " may differ from what it was before.");
+/** Restores the file and lets the provider read it again. Returns a note for the client if the file is not restored. */
+std::string Transaction::rollBack(const FileState& before) const {
+    try {
+        if (file.hasRecords && !before.restorable.empty()) {
+            session.setOutdated();
+        }
+        file.rollBack(before);
+        return {};
+    } catch (const Failure& failure) {
+        return " The change could not be rolled back. " + failure.message;
+    } catch (const std::exception& exception) {
+        return std::string(" The change could not be rolled back. ") + exception.what();
+    }
 }
 
-void Transaction::create(const Values& given, const std::function<void()>& returnPath) {
+void Transaction::create(const std::string& identifier, const Values& given, const std::function<void()>& returnPath) {
     requireRoundTrip(file, *findProperty(owner, identifierKey), identifier);
     requireRoundTrip(file, given);
     requireReadOnlyValues(given);
-    file.requireWritable(identifier.size() + 1 + sizeOf(given));
-    const std::optional<std::size_t> before = file.countRecordsIfComplete(identifier);
-    const auto change = [&] {
+    run(identifier.size() + 1 + sizeOf(given), !given.empty(), [&](const FileState& before) {
         session.create(path);
         const CMPIInstance* current = session.get(path, owner);
         const Values changes = diff(current, given, false);
-        const FileState created = file.state();
-        requireRecord(created);
+        const FileState created = altersFile(file, current, changes) ? file.state() : before;
         if (!changes.empty()) {
-            apply(current, changes, created);
+            apply(current, changes);
         }
+        file.commit(created, true, &identifier);
         returnPath();
-    };
-    runOrRollBack(change, [&] {
-        session.remove(path);
-        return hasCount(before);
     });
 }
 
 void Transaction::modify(const CMPIInstance* current, const Values& changes) {
     requireRoundTrip(file, changes);
-    file.requireWritable(sizeOf(changes));
-    const FileState before = file.state();
-    const Values restored = rollbackValues(owner, file, changes, current);
-    const Values rollback = valuesToSend(owner, current, restored);
-    runOrRollBack([&] { apply(current, changes, before); },
-                  [&] {
-                      const FileState failed = file.state();
-                      session.modify(path, rollback);
-                      return file.hasRecords() ? isRolledBack(before, failed)
-                                               : equalOn(restored, current, session.get(path, owner));
-                  });
-}
-
-void Transaction::remove(const CMPIInstance* current) {
-    const Values restored = valuesOf(current, owner, [](const Property&) { return true; });
-    file.requireWritable(0);
-    const std::optional<std::size_t> before = file.countRecordsIfComplete(identifier);
-    const auto change = [&] {
-        session.remove(path);
-        const std::size_t after = file.countRecords(file.state().content, identifier);
-        if (after != 0 && after >= before.value_or(0)) {
-            fail(CMPI_RC_ERR_FAILED, std::string(file.fileName) + " still holds " + identifier + ".");
-        }
-    };
-    runOrRollBack(change, [&] {
-        const bool exists = session.find(path, owner) != nullptr || recreate(restored);
-        return exists && hasCount(before);
+    run(sizeOf(changes), false, [&](const FileState& before) {
+        apply(current, changes);
+        file.commit(before, altersFile(file, current, changes));
     });
 }
 
-/** Makes the changes. Fails unless they are stored. */
-void Transaction::apply(const CMPIInstance* current, const Values& changes, const FileState& before) {
+void Transaction::remove() {
+    run(0, false, [&](const FileState& before) {
+        session.remove(path);
+        file.commit(before, true);
+    });
+}
+
+/** Makes the changes. Fails unless the provider has them. */
+void Transaction::apply(const CMPIInstance* current, const Values& changes) const {
     session.modify(path, valuesToSend(owner, current, changes));
     requireChanged(owner, file, current, session.get(path, owner), changes);
-    const FileState after = file.state();
-    requireRecord(after);
-    if (file.hasRecords() && after == before && altersFile(file, current, changes)) {
-        fail(CMPI_RC_ERR_FAILED, std::string(file.fileName) + " was not written.");
-    }
 }
 
-/** Creates a deleted record again. Returns whether its values have been written. */
-bool Transaction::recreate(const Values& values) {
-    try {
-        session.create(path);
-    } catch (const Failure&) {
-        // The record may exist: the last step that can fail is the answer.
+/**
+ * Fails if the provider does not have as many records as its file, so that its next write would lose some: it does not
+ * report that it could not read the file.
+ */
+void Transaction::requireTable() const {
+    if (!file.hasRecords || theConnection.isVerified(owner)) {
+        return;
     }
-    const CMPIInstance* created = session.get(path, owner);
-    const FileState before = file.state();
-    const bool isAltered = altersFile(file, created, values);
-    session.modify(path, values);
-    return !isAltered || !(file.state() == before);
-}
-
-void Transaction::requireRecord(const FileState& state) const {
-    if (file.hasRecords() && file.countRecords(state.content, identifier) == 0) {
-        fail(CMPI_RC_ERR_FAILED, std::string(file.fileName) + " does not hold " + identifier + ".");
+    if (!file.hasCount(session.names(LocalObjectPath(nameSpaceOf(path.handle()), owner)).size())) {
+        session.setOutdated();
+        fail(CMPI_RC_ERR_FAILED, std::string(file.fileName) +
+                                     " has other records than the provider. It is read again; repeat the request.");
     }
+    theConnection.setVerified(owner);
 }
 
 /** Refuses other read-only values than an existing record has, since all records have the same. */
@@ -174,22 +133,6 @@ void Transaction::requireReadOnlyValues(const Values& given) const {
     if (!paths.empty()) {
         diff(session.get(localPath(paths.front(), owner), owner), readOnly, false);
     }
-}
-
-/** Whether the file is complete and has as many records with the identifier as before, if that is known. */
-bool Transaction::hasCount(std::optional<std::size_t> before) const {
-    const std::optional<std::size_t> now = file.countRecordsIfComplete(identifier);
-    return now && now == before.value_or(*now);
-}
-
-/**
- * Whether the file is complete and without a change that failed.
- * @param before its state before the change
- * @param failed its state before the rollback
- */
-bool Transaction::isRolledBack(const FileState& before, const FileState& failed) const {
-    const FileState now = file.state();
-    return file.isComplete(now.content) && (now.content == before.content || !(now == failed));
 }
 
 }  // namespace gate

@@ -29,7 +29,7 @@ whole path in the quotes of your shell:
 constexpr auto closing =
     R"(
 Environment: CIMHOST_SCHEMA, CIMHOST_REGISTRATION and CIMHOST_LIBRARY_PATH are lists of files or directories,
-separated by colons, that replace options which are not given.
+separated by colons, that replace options which are not given. CIMHOST_PROVIDER replaces --provider.
 
 Exit status: 0 success, 1 the request failed, 2 wrong command line, 3 a library, registration or schema cannot be
 loaded, 4 the output cannot be written.)";
@@ -90,6 +90,9 @@ void addCommonOptions(CLI::App& app, Arguments& arguments) {
     addRepeatable(app, "--registration", arguments.registrations, "FILE",
                   "Provider registration file, or a directory of them");
     addRepeatable(app, "--library-path", arguments.libraryPaths, "DIR", "Directory with provider libraries");
+    addChoice<std::string>(app, "--provider", "Provider of classes that a gate serves: gate (default) or bare",
+                           arguments.provider, {{"gate", "gate"}, {"bare", "bare"}})
+        ->type_name("NAME");
     app.add_option("--namespace", arguments.nameSpace, "Namespace of paths without one")
         ->type_name("NAME")
         ->capture_default_str();

@@ -52,6 +52,7 @@ struct Arguments {
     std::vector<std::string> schemas{};
     std::vector<std::string> registrations{};
     std::vector<std::string> libraryPaths{};
+    std::string provider{};  ///< "gate" or "bare"; empty: not given
     std::string nameSpace = "root/cimv2";
     Format format = Format::text;
     bool raw = false;

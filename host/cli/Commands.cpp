@@ -30,12 +30,26 @@ Schema readSchema(const SearchPaths& paths) {
     return schema;
 }
 
-std::vector<ProviderRegistration> readRegistrations(const SearchPaths& paths) {
+std::vector<ProviderRegistration> readRegistrationFiles(const std::vector<std::filesystem::path>& files) {
     std::vector<ProviderRegistration> registrations;
-    for (const auto& file : paths.registrations) {
+    for (const auto& file : files) {
         const std::vector<ProviderRegistration> found = readRegistrationFile(file);
         registrations.insert(registrations.end(), found.begin(), found.end());
     }
+    return registrations;
+}
+
+/** The registrations of the gates, and those of classes that no gate serves. */
+std::vector<ProviderRegistration> readRegistrations(const SearchPaths& paths) {
+    const std::vector<ProviderRegistration> gates = readRegistrationFiles(paths.gates);
+    std::vector<ProviderRegistration> registrations = readRegistrationFiles(paths.registrations);
+    const auto isReplaced = [&](const ProviderRegistration& each) {
+        return std::any_of(gates.begin(), gates.end(), [&](const ProviderRegistration& gate) {
+            return cim::sameName(gate.className, each.className);
+        });
+    };
+    registrations.erase(std::remove_if(registrations.begin(), registrations.end(), isReplaced), registrations.end());
+    registrations.insert(registrations.end(), gates.begin(), gates.end());
     return registrations;
 }
 

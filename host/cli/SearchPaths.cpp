@@ -7,6 +7,7 @@
 #include <system_error>
 
 #include "Installation.h"
+#include "cli/ExitStatus.h"
 #include "schema/Errors.h"
 
 namespace cimhost {
@@ -25,6 +26,7 @@ struct Kind {
 constexpr Kind schemaKind{"schema", "--schema", "CIMHOST_SCHEMA", ".mof"};
 constexpr Kind registrationKind{"registration", "--registration", "CIMHOST_REGISTRATION", ".reg"};
 constexpr auto libraryVariable = "CIMHOST_LIBRARY_PATH";
+constexpr auto providerVariable = "CIMHOST_PROVIDER";
 
 fs::path programDirectory() {
     std::error_code error;
@@ -64,14 +66,20 @@ std::vector<fs::path> filesIn(const fs::path& directory, const Kind& kind) {
     return files;
 }
 
-std::vector<fs::path> findFiles(const std::vector<std::string>& options, const Kind& kind) {
+/** The files and directories of the options, of the environment variable, or of the installation or build tree. */
+std::vector<std::string> findEntries(const std::vector<std::string>& options, const Kind& kind) {
     std::vector<std::string> entries = configured(options, kind.variable);
     const fs::path standard = programDirectory() / installation::dataDirectory;
     std::error_code error;
     if (entries.empty() && fs::is_directory(standard, error)) {
         entries.push_back(standard.lexically_normal().string());
     }
+    return entries;
+}
+
+std::vector<fs::path> findFiles(const std::vector<std::string>& entries, const Kind& kind) {
     std::vector<fs::path> files;
+    std::error_code error;
     for (const std::string& entry : entries) {
         const std::vector<fs::path> found =
             fs::is_directory(entry, error) ? filesIn(entry, kind) : std::vector<fs::path>{entry};
@@ -80,6 +88,30 @@ std::vector<fs::path> findFiles(const std::vector<std::string>& options, const K
     if (files.empty()) {
         throw LoadError(std::string("there is no ") + kind.name + ": name a file with " + kind.option + " or in " +
                         kind.variable);
+    }
+    return files;
+}
+
+/** Whether to use gates: the choice of the option, or else of the environment variable. */
+bool usesGates(const std::string& option) {
+    const char* value = ::secure_getenv(providerVariable);
+    const std::string provider = !option.empty() ? option : value == nullptr ? "" : value;
+    if (provider != "gate" && provider != "bare" && !provider.empty()) {
+        throw UsageError(std::string(providerVariable) + " is \"" + provider + "\"; set it to gate or bare");
+    }
+    return provider != "bare";
+}
+
+std::vector<fs::path> findGates(const std::vector<std::string>& entries, const std::string& option) {
+    std::vector<fs::path> files;
+    if (usesGates(option)) {
+        for (const std::string& entry : entries) {
+            std::error_code error;
+            const fs::path directory = fs::path(entry) / "gate";
+            const std::vector<fs::path> found =
+                fs::is_directory(directory, error) ? filesIn(directory, registrationKind) : std::vector<fs::path>{};
+            files.insert(files.end(), found.begin(), found.end());
+        }
     }
     return files;
 }
@@ -107,7 +139,9 @@ std::vector<fs::path> findLibraryPaths(const std::vector<std::string>& options) 
 }  // namespace
 
 SearchPaths findSearchPaths(const Arguments& arguments) {
-    return {findFiles(arguments.schemas, schemaKind), findFiles(arguments.registrations, registrationKind),
+    const std::vector<std::string> registrations = findEntries(arguments.registrations, registrationKind);
+    return {findFiles(findEntries(arguments.schemas, schemaKind), schemaKind),
+            findFiles(registrations, registrationKind), findGates(registrations, arguments.provider),
             findLibraryPaths(arguments.libraryPaths)};
 }
 

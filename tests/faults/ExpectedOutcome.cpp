@@ -103,6 +103,17 @@ Lines linesOf(const std::string& content) {
     return lines;
 }
 
+/** Returns whether a fault may prevent a modification from reading asset.dat, but not from writing it. */
+bool mayPreventReading(const Fault& fault) {
+    if (fault.lasting) {
+        return false;  // writing fails as well
+    }
+    const bool isOfReading =
+        fault.kind == operationOpen || fault.kind == operationRead || fault.kind == operationStatus;
+    const bool isIgnored = fault.error == EINTR || fault.error == 0;
+    return !isOnFiles(fault.kind) || (isOfReading && !isIgnored);
+}
+
 }  // namespace
 
 ExpectedOutcome runWithoutFaults(TestEnvironment& environment, const Request& request) {
@@ -156,16 +167,6 @@ bool preventsReading(const Fault& fault) {
     const bool isOfReading =
         std::find(reading.begin(), reading.end(), std::make_pair(fault.kind, fault.number)) != reading.end();
     return mayPreventReading(fault) && (!isOnFiles(fault.kind) || isOfReading);
-}
-
-bool mayPreventReading(const Fault& fault) {
-    if (fault.lasting) {
-        return false;  // writing fails as well
-    }
-    const bool isOfReading =
-        fault.kind == operationOpen || fault.kind == operationRead || fault.kind == operationStatus;
-    const bool isIgnored = fault.error == EINTR || fault.error == 0;
-    return !isOnFiles(fault.kind) || (isOfReading && !isIgnored);
 }
 
 std::string assetWithFields(const ExpectedOutcome& expected, std::size_t readFields) {

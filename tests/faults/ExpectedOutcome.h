@@ -32,9 +32,6 @@ void expectSetInOrder(const ExpectedOutcome& expected, const Request& request, c
 /** Returns whether a fault prevents the provider from reading asset.dat in a modification, but not from writing it. */
 bool preventsReading(const Fault& fault);
 
-/** Returns whether a fault may prevent a modification from reading asset.dat, but not from writing it. */
-bool mayPreventReading(const Fault& fault);
-
 /**
  * Returns the content of asset.dat after a modification that could read only the first `readFields` fields: the
  * remaining fields that the request does not set are empty. `readFields` is 0 if the file could not be read.

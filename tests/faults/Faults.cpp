@@ -20,8 +20,9 @@ namespace faults {
 namespace {
 
 constexpr std::array<const char*, operationKinds + 1> names{
-    "allocation", "taking of memory", "opening", "reading", "writing", "seeking",        "syncing",
-    "renaming",   "removing",         "closing", "asking",  "owning",  "path resolving", "operation on files",
+    "allocation", "taking of memory", "opening",        "reading",  "writing",
+    "seeking",    "syncing",          "renaming",       "removing", "closing",
+    "asking",     "owning",           "path resolving", "locking",  "operation on files",
 };
 
 /** The faults of this thread. The functions that use it do not allocate. */
@@ -169,6 +170,7 @@ const std::vector<Failure>& fileFailures() {
         {operationRead, 0},        {operationWrite, ENOSPC},     {operationWrite, EINTR},    {operationWrite, 0},
         {operationSync, EIO},      {operationRename, ENOSPC},    {operationRemove, EACCES},  {operationClose, EIO},
         {operationStatus, EACCES}, {operationAttributes, EPERM}, {operationResolve, EACCES}, {operationSeek, EIO},
+        {operationLock, ENOLCK},
     };
     return all;
 }

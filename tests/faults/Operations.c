@@ -184,6 +184,21 @@ static int predictableTemporary(char* pattern, int flags) {
         return failure.error != 0 ? -1 : 0;                               \
     }
 
+/** Defines a function that locks a file. Other commands of it do not fail. */
+#define INTERPOSE_LOCK(name)                                                    \
+    VISIBLE int name(int file, int command, ...) {                              \
+        va_list rest;                                                           \
+        va_start(rest, command);                                                \
+        void* const argument = va_arg(rest, void*);                             \
+        va_end(rest);                                                           \
+        const struct OperationFailure failure = failureOf(operationLock);       \
+        if (failure.error != 0 && (command == F_SETLK || command == F_GETLK)) { \
+            errno = failure.error;                                              \
+            return -1;                                                          \
+        }                                                                       \
+        return NEXT(name)(file, command, argument);                             \
+    }
+
 #ifndef LAW_SANITIZE
 INTERPOSE_ALLOCATION(malloc, (size_t size), (size))
 INTERPOSE_ALLOCATION(calloc, (size_t count, size_t size), (count, size))
@@ -230,6 +245,10 @@ INTERPOSE(operationStatus, -1, int, fstat64, (int file, struct stat64* status), 
 INTERPOSE_PATH(operationStatus, -1, int, statvfs, (const char* path, struct statvfs* status), (path, status))
 INTERPOSE_PATH(operationStatus, -1, int, access, (const char* path, int mode), (path, mode))
 INTERPOSE(operationWrite, -1, int, ftruncate, (int file, off_t length), (file, length))
+INTERPOSE_PATH(operationWrite, -1, int, truncate, (const char* path, off_t length), (path, length))
+INTERPOSE_PATH(operationWrite, -1, int, truncate64, (const char* path, off64_t length), (path, length))
+INTERPOSE_LOCK(fcntl)
+INTERPOSE_LOCK(fcntl64)
 INTERPOSE(operationAttributes, -1, int, fchmod, (int file, mode_t mode), (file, mode))
 INTERPOSE(operationAttributes, -1, int, fchown, (int file, uid_t owner, gid_t group), (file, owner, group))
 INTERPOSE_PATH(operationResolve, NULL, char*, realpath, (const char* path, char* resolved), (path, resolved))

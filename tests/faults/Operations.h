@@ -15,7 +15,7 @@ enum OperationKind {
     operationTakeMemory, /**< malloc, calloc, realloc, except in operator new; not counted with sanitizers */
     operationOpen,       /**< open, openat, mkostemp, fopen, fdopen, mkdir, socket */
     operationRead,       /**< read */
-    operationWrite,      /**< write, writev, fwrite, fflush, sendto */
+    operationWrite,      /**< write, writev, fwrite, fflush, sendto, truncate, ftruncate */
     operationSeek,       /**< lseek */
     operationSync,       /**< fsync */
     operationRename,     /**< rename */
@@ -24,6 +24,7 @@ enum OperationKind {
     operationStatus,     /**< stat, fstat, statvfs, access */
     operationAttributes, /**< fchmod, fchown */
     operationResolve,    /**< realpath */
+    operationLock,       /**< fcntl */
     operationKinds
 };
 

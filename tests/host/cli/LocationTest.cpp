@@ -9,6 +9,7 @@ namespace {
 
 using testing::AllOf;
 using testing::HasSubstr;
+using testing::Not;
 using testing::StartsWith;
 
 Environment testEnvironment() {
@@ -41,6 +42,27 @@ TEST(Location, ADirectoryMeansItsFilesAndSeveralCanBeNamed) {
     EXPECT_EQ(
         runBare({"--schema", (directory.path / "a").string(), "--schema", three, "classes"}, {registration}).output,
         "One    -\nTwo    -\nThree  -\n");
+}
+
+TEST(Location, AGateReplacesTheProviderOfItsClassesUnlessTheBareOneIsChosen) {
+    const TemporaryDirectory directory;
+    const std::string rest = " location: x\n type: instance\n namespace: root/cimv2\n#\n";
+    directory.write("all.reg", "[One]\n provider: Bare\n" + rest + "[Two]\n provider: Bare\n" + rest);
+    directory.write("gate/gate.reg", "[one]\n provider: Gate\n" + rest);
+    const std::string schema = directory.write("1.mof", "class One { [Key] string K; }; class Two : One {};").string();
+    const auto list = [&](std::vector<std::string> options, Environment environment) {
+        environment.push_back("CIMHOST_REGISTRATION=" + directory.path.string());
+        options.insert(options.end(), {"--schema", schema, "classes"});
+        return runBare(options, environment);
+    };
+    const auto showsGate = AllOf(HasSubstr("Gate"), HasSubstr("Two  instance  Bare"));
+    EXPECT_THAT(list({}, {}).output, showsGate);
+    EXPECT_THAT(list({"--provider", "bare"}, {}).output, Not(HasSubstr("Gate")));
+    EXPECT_THAT(list({}, {"CIMHOST_PROVIDER=bare"}).output, Not(HasSubstr("Gate")));
+    EXPECT_THAT(list({"--provider", "gate"}, {"CIMHOST_PROVIDER=bare"}).output, showsGate);
+    const Ended refused = list({}, {"CIMHOST_PROVIDER=other"});
+    EXPECT_EQ(refused.status, 2);
+    EXPECT_THAT(refused.error, HasSubstr("CIMHOST_PROVIDER is \"other\"; set it to gate or bare"));
 }
 
 TEST(Location, WithoutAnyItIsTheDataDirectoryBesideTheProgram) {

@@ -1,0 +1,88 @@
+#include "DirectoryLock.h"
+
+#include "Files.h"
+
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <cerrno>
+#include <system_error>
+
+namespace durable {
+
+namespace {
+
+/** A lock of all bytes of the file. */
+struct flock lockOfFile() {
+    struct flock lock {};
+    lock.l_type = F_WRLCK;
+    lock.l_whence = SEEK_SET;
+    return lock;
+}
+
+}  // namespace
+
+DirectoryLock::Result DirectoryLock::acquire(const std::string& directory) {
+    const std::string path = directory + "owner";
+    if (isHeldIn(path)) {
+        return {State::held};
+    }
+    release();  // inherited from the parent process, or removed from the directory
+    descriptor = open(path.c_str(), O_RDWR | O_CREAT | O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK, 0644);
+    const bool isOpen = descriptor >= 0;
+    struct flock lock = lockOfFile();
+    if (isOpen && fcntl(descriptor, F_SETLK, &lock) == 0) {
+        process = getpid();
+        writeOwner();
+        return {State::acquired};
+    }
+    const int error = errno;
+    if (!isOpen && (error == EMFILE || error == ENFILE || error == ENOMEM || error == EIO)) {
+        throw std::system_error(error, std::generic_category(), path);
+    }
+    const bool isOther = isOpen && (error == EACCES || error == EAGAIN);
+    Result result{isOther                     ? State::heldByOther
+                  : isOpen || error == ENOENT ? State::unavailable
+                                              : State::denied,
+                  isOther ? ownerOf(path) : path + ": " + std::generic_category().message(error)};
+    release();
+    return result;
+}
+
+/** Whether this process holds the lock of the file that now has this path. */
+bool DirectoryLock::isHeldIn(const std::string& path) const {
+    struct stat held {};
+    struct stat found {};
+    return descriptor >= 0 && process == getpid() && fstat(descriptor, &held) == 0 && stat(path.c_str(), &found) == 0 &&
+           held.st_dev == found.st_dev && held.st_ino == found.st_ino;
+}
+
+void DirectoryLock::release() {
+    if (descriptor >= 0) {
+        close(descriptor);
+        descriptor = -1;
+    }
+}
+
+void DirectoryLock::writeOwner() const {
+    const std::string owner = std::to_string(process) + " " + program_invocation_short_name + "\n";
+    const bool isWritten = ftruncate(descriptor, 0) == 0 &&
+                           write(descriptor, owner.data(), owner.size()) == static_cast<ssize_t>(owner.size());
+    static_cast<void>(isWritten);  // the lock holds without it
+}
+
+/** The process id is from the system or, for an owner in another container, from the file; the name is from the file.
+ */
+std::string DirectoryLock::ownerOf(const std::string& path) const {
+    struct flock lock = lockOfFile();
+    const bool isKnown = fcntl(descriptor, F_GETLK, &lock) == 0 && lock.l_type != F_UNLCK && lock.l_pid > 0;
+    std::string owner = readFile(path).value_or(std::string());
+    owner.resize(std::min(owner.find('\n'), owner.size()));
+    const std::string id = isKnown ? std::to_string(lock.l_pid) : owner.substr(0, owner.find(' '));
+    const bool isNamed = owner.compare(0, id.size() + 1, id + " ") == 0;
+    return "process " + id + (isNamed ? " (" + owner.substr(id.size() + 1) + ")" : "");
+}
+
+}  // namespace durable

@@ -1,0 +1,71 @@
+#include "SavedCopies.h"
+
+#include "Files.h"
+
+#include <unistd.h>
+
+#include <algorithm>
+#include <charconv>
+#include <utility>
+
+namespace durable {
+
+namespace {
+
+constexpr std::string_view beginningOfLastLine = "saved copy ";
+
+}  // namespace
+
+std::string SavedCopies::lastLine(const Copy& copy) const {
+    return std::string(beginningOfLastLine) + std::to_string(copy.number) + " of " + name +
+           (copy.isUnfinished ? " before an unfinished change" : "") + "\n";
+}
+
+SavedCopies::Copy SavedCopies::read(const std::string& path) const {
+    const std::string content = readFile(path).value_or(std::string());
+    const std::size_t start = std::min(content.rfind(beginningOfLastLine), content.size());
+    const char* number = content.data() + std::min(start + beginningOfLastLine.size(), content.size());
+    Copy copy{path};
+    std::from_chars(number, content.data() + content.size(), copy.number);
+    copy.isUnfinished = content.find(" before ", start) != std::string::npos;
+    const bool hasHoles = content.find('\0') != std::string::npos;  // left by a file system that lost power
+    if (hasHoles || content.substr(start) != lastLine(copy)) {
+        return {path};
+    }
+    copy.content = content.substr(0, start);
+    return copy;
+}
+
+/** Both copies, the older one first. */
+std::array<SavedCopies::Copy, 2> SavedCopies::byAge() const {
+    std::array<Copy, 2> copies{read(paths[0]), read(paths[1])};
+    if (copies[0].number > copies[1].number) {
+        std::swap(copies[0], copies[1]);
+    }
+    return copies;
+}
+
+void SavedCopies::save(std::string_view content, bool isUnfinished) const {
+    const auto [older, last] = byAge();
+    if (older.content.empty()) {  // then its name may not be on the disk
+        createFile(older.path);
+        syncDirectoryOf(older.path);
+    }
+    overwriteFile(older.path, std::string(content) + lastLine({{}, {}, last.number + 1, isUnfinished}), file);
+}
+
+/**
+ * The directory is synced before the file is shortened and the other copy is removed: until the new name is on the
+ * disk, the copies must stay.
+ */
+void SavedCopies::restoreLatest() const {
+    const auto [older, last] = byAge();
+    renameFile(last.path, file);
+    syncDirectoryOf(file);
+    // Neither a later line nor an old copy matters, so these need not succeed.
+    const bool isTidy =
+        truncate(file.c_str(), static_cast<off_t>(last.content.size())) == 0 && unlink(older.path.c_str()) == 0;
+    static_cast<void>(isTidy);
+}
+
+}  // namespace durable

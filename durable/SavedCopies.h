@@ -1,0 +1,47 @@
+#pragma once
+
+#include <array>
+#include <cstdint>
+#include <string>
+#include <string_view>
+
+namespace durable {
+
+/**
+ * Two copies of the content of a file. Each new copy overwrites the older one, so that the other one is complete
+ * meanwhile. This takes one sync, since the names on the disk stay the same.
+ *
+ * A copy ends with a line that has its number and the file's name; a copy that was cut lacks it. All functions throw
+ * std::system_error if a file cannot be read or written.
+ */
+class SavedCopies {
+public:
+    struct Copy {
+        std::string path{};
+        std::string content{};      ///< without the last line; empty if there is no complete copy
+        std::uint64_t number = 0;   ///< one more than that of the copy before
+        bool isUnfinished = false;  ///< whether a change that writes the file more than once has begun since
+    };
+
+    explicit SavedCopies(const std::string& itsFile)
+        : file(itsFile), name(file.substr(file.rfind('/') + 1)), paths{file + ".saved1", file + ".saved2"} {}
+
+    Copy latest() const { return byAge()[1]; }
+
+    /** Writes a copy to the disk. It has the mode, owner and group of the file. */
+    void save(std::string_view content, bool isUnfinished) const;
+
+    /** Makes the latest copy the file, which needs no disk space. Removes the other one. */
+    void restoreLatest() const;
+
+private:
+    Copy read(const std::string& path) const;
+    std::array<Copy, 2> byAge() const;
+    std::string lastLine(const Copy& copy) const;
+
+    std::string file;
+    std::string name;
+    std::array<std::string, 2> paths;
+};
+
+}  // namespace durable

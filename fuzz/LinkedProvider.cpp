@@ -1,0 +1,34 @@
+#include "gate/session/ProviderLibrary.h"
+
+#include "SystemUnderTest.h"
+
+// Gives the gate a provider that is linked into the fuzzer: loading it only destroys and reads its tables.
+
+extern "C" {
+CMPIInstanceMI* LeaseAndWarrantyProvider_Create_InstanceMI(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
+CMPIAssociationMI* LeaseAndWarrantyProvider_Create_AssociationMI(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
+}
+
+namespace gate {
+
+void ProviderLibrary::load() {
+    fuzz::SystemUnderTest::restart();
+    handle = this;
+}
+
+bool ProviderLibrary::unload() {
+    handle = nullptr;
+    return true;
+}
+
+CMPIInstanceMI* ProviderLibrary::createInstanceMI(const CMPIBroker* broker) const {
+    CMPIStatus status{CMPI_RC_OK, nullptr};
+    return LeaseAndWarrantyProvider_Create_InstanceMI(broker, nullptr, &status);
+}
+
+CMPIAssociationMI* ProviderLibrary::createAssociationMI(const CMPIBroker* broker) const {
+    CMPIStatus status{CMPI_RC_OK, nullptr};
+    return LeaseAndWarrantyProvider_Create_AssociationMI(broker, nullptr, &status);
+}
+
+}  // namespace gate

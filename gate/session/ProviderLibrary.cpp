@@ -1,0 +1,60 @@
+#include "ProviderLibrary.h"
+
+#include <dlfcn.h>
+
+#include <stdexcept>
+#include <string>
+
+namespace gate {
+
+namespace {
+
+constexpr const char* libraryName = "libLeaseAndWarrantyProvider.so";
+
+/** The provider's file: in the directory of the file that contains this function. */
+std::string libraryPath() {
+    Dl_info self{};
+    const bool isKnown = dladdr(reinterpret_cast<const void*>(&libraryPath), &self) != 0 && self.dli_fname != nullptr;
+    const std::string file = isKnown ? self.dli_fname : "";
+    return file.substr(0, file.rfind('/') + 1) + libraryName;
+}
+
+template <class Interface>
+Interface* callFactory(void* library, const char* name, const CMPIBroker* broker) {
+    using Factory = Interface*(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
+    auto* factory = reinterpret_cast<Factory*>(dlsym(library, name));
+    CMPIStatus status{CMPI_RC_OK, nullptr};
+    return factory == nullptr ? nullptr : factory(broker, nullptr, &status);
+}
+
+}  // namespace
+
+void ProviderLibrary::load() {
+    const std::string path = libraryPath();
+    if (void* const other = dlopen(path.c_str(), RTLD_NOW | RTLD_NOLOAD)) {
+        dlclose(other);
+        throw std::runtime_error("The provider is also loaded without the gate. Register only one of them.");
+    }
+    handle = dlopen(path.c_str(), RTLD_NOW | RTLD_LOCAL);
+    if (handle == nullptr) {
+        const char* reason = dlerror();
+        throw std::runtime_error(std::string("The provider cannot be loaded: ") + (reason == nullptr ? "" : reason));
+    }
+}
+
+void ProviderLibrary::unload() {
+    if (handle != nullptr) {
+        dlclose(handle);
+        handle = nullptr;
+    }
+}
+
+CMPIInstanceMI* ProviderLibrary::createInstanceMI(const CMPIBroker* broker) const {
+    return callFactory<CMPIInstanceMI>(handle, "LeaseAndWarrantyProvider_Create_InstanceMI", broker);
+}
+
+CMPIAssociationMI* ProviderLibrary::createAssociationMI(const CMPIBroker* broker) const {
+    return callFactory<CMPIAssociationMI>(handle, "LeaseAndWarrantyProvider_Create_AssociationMI", broker);
+}
+
+}  // namespace gate

@@ -1,0 +1,138 @@
+#include "durable/DirectoryLock.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <csignal>
+#include <filesystem>
+#include <functional>
+
+#include "support/Files.h"
+
+namespace durable {
+namespace {
+
+using testing::HasSubstr;
+using State = DirectoryLock::State;
+
+/** Runs work in a child process and returns its result, from 0 to 127. */
+int inChild(const std::function<int()>& work) {
+    const pid_t child = fork();
+    if (child == 0) {
+        _exit(work());
+    }
+    int status = 0;
+    waitpid(child, &status, 0);
+    return WIFEXITED(status) ? WEXITSTATUS(status) : -1;
+}
+
+class DirectoryLockTest : public testing::Test {
+protected:
+    /** The result of another process that tries to acquire the lock. */
+    State stateInChild() {
+        return static_cast<State>(inChild([&] {
+            DirectoryLock lock;
+            return static_cast<int>(lock.acquire(path).state);
+        }));
+    }
+
+    const testsupport::TempDirectory directory;
+    const std::string path = directory.withSlash();
+    DirectoryLock held;
+};
+
+TEST_F(DirectoryLockTest, IsHeldByOneProcess) {
+    EXPECT_EQ(held.acquire(path).state, State::acquired);
+    EXPECT_EQ(held.acquire(path).state, State::held) << "already";
+    EXPECT_EQ(stateInChild(), State::heldByOther);
+    held.release();
+    EXPECT_EQ(stateInChild(), State::acquired);
+}
+
+TEST_F(DirectoryLockTest, NamesItsOwner) {
+    held.acquire(path);
+    const std::string owner = "process " + std::to_string(getpid()) + " (durable_test)";
+    EXPECT_EQ(inChild([&] {
+                  DirectoryLock lock;
+                  return lock.acquire(path).reason == owner ? 0 : 1;
+              }),
+              0)
+        << testsupport::readFile(directory.path() / "owner");
+}
+
+TEST_F(DirectoryLockTest, EndsWithItsProcess) {
+    int ready[2];
+    ASSERT_EQ(pipe(ready), 0);
+    const pid_t owner = fork();
+    if (owner == 0) {
+        held.acquire(path);
+        const bool isWritten = write(ready[1], "x", 1) == 1;
+        pause();
+        _exit(isWritten ? 0 : 1);
+    }
+    char byte = 0;
+    ASSERT_EQ(read(ready[0], &byte, 1), 1);
+    EXPECT_EQ(stateInChild(), State::heldByOther);
+    kill(owner, SIGKILL);
+    waitpid(owner, nullptr, 0);
+    EXPECT_EQ(held.acquire(path).state, State::acquired);
+    close(ready[0]);
+    close(ready[1]);
+}
+
+TEST_F(DirectoryLockTest, AForkedChildNeitherHoldsNorKeepsIt) {
+    held.acquire(path);
+    EXPECT_EQ(inChild([&] { return static_cast<int>(held.acquire(path).state); }),
+              static_cast<int>(State::heldByOther));
+    int end[2];
+    ASSERT_EQ(pipe(end), 0);
+    const pid_t child = fork();
+    if (child == 0) {
+        close(end[1]);
+        char byte = 0;
+        _exit(static_cast<int>(read(end[0], &byte, 1)));  // until the parent closes the pipe
+    }
+    held.release();
+    EXPECT_EQ(stateInChild(), State::acquired) << "while the child has inherited the file";
+    close(end[0]);
+    close(end[1]);
+    waitpid(child, nullptr, 0);
+}
+
+TEST_F(DirectoryLockTest, ACopiedFileLocksNothing) {
+    testsupport::writeFile(directory.path() / "owner", "1 init\n");
+    EXPECT_EQ(held.acquire(path).state, State::acquired);
+}
+
+TEST_F(DirectoryLockTest, FollowsADirectoryThatIsReplaced) {
+    held.acquire(path);
+    std::filesystem::remove(directory.path() / "owner");
+    EXPECT_EQ(held.acquire(path).state, State::acquired);
+    EXPECT_EQ(stateInChild(), State::heldByOther);
+}
+
+TEST_F(DirectoryLockTest, IsDeniedToAProcessThatMustNotWriteItsFile) {
+    held.acquire(path);
+    held.release();
+    std::filesystem::permissions(directory.path(), std::filesystem::perms(0755));
+    EXPECT_EQ(inChild([&] {
+                  constexpr uid_t unprivileged = 65534;
+                  DirectoryLock lock;
+                  return geteuid() == 0 && setresuid(unprivileged, unprivileged, unprivileged) != 0
+                             ? 127
+                             : static_cast<int>(lock.acquire(path).state);
+              }),
+              static_cast<int>(geteuid() == 0 ? State::denied : State::acquired));
+}
+
+TEST_F(DirectoryLockTest, ReportsWhyItIsUnavailable) {
+    const DirectoryLock::Result result = held.acquire("/nonexistent/directory/");
+    EXPECT_EQ(result.state, State::unavailable);
+    EXPECT_THAT(result.reason, HasSubstr("No such file or directory"));
+}
+
+}  // namespace
+}  // namespace durable

@@ -1,0 +1,279 @@
+#include "durable/RecordFile.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <sys/stat.h>
+
+#include <filesystem>
+#include <string>
+#include <system_error>
+
+#include "support/Files.h"
+
+namespace durable {
+namespace {
+
+namespace fs = std::filesystem;
+using testing::AllOf;
+using testing::HasSubstr;
+using testing::IsEmpty;
+using testsupport::readFile;
+using testsupport::writeFile;
+
+/** A warranty file with these identifiers. */
+std::string records(std::initializer_list<const char*> identifiers) {
+    std::string content = std::to_string(identifiers.size()) + "\n";
+    for (const char* identifier : identifiers) {
+        content += std::string(identifier) + "\nWarrantor\n20260101000000.000000+000\n12\n";
+    }
+    return content;
+}
+
+class RecordFileTest : public testing::Test {
+protected:
+    /** Prepares a change of the current content. */
+    std::string prepare(bool hasSteps = false) const {
+        return file.prepare(file.content().value_or(std::string()), hasSteps);
+    }
+
+    fs::path in(const char* name) const { return directory.path() / name; }
+
+    const testsupport::TempDirectory directory;
+    const RecordFile file = recordFileIn(directory.withSlash(), "Warranty.dat");
+    const fs::path path = in("Warranty.dat");
+    const fs::path saved = in("Warranty.dat.saved1");  ///< the first copy
+    const fs::path second = in("Warranty.dat.saved2");
+    const fs::path damaged = in("Warranty.dat.damaged");
+};
+
+TEST_F(RecordFileTest, AFileIsCompleteIfItHasThePromisedLines) {
+    for (const std::string& content : {records({"W1", "W2"}), records({}), std::string("0"), "\n " + records({"W1"}),
+                                       "+" + records({"W1"}), records({"W1"}) + "a later line\n"}) {
+        EXPECT_TRUE(file.isComplete(content)) << content;
+    }
+}
+
+TEST_F(RecordFileTest, AFileIsIncompleteIfItIsCutOrHasNoCount) {
+    const std::string content = records({"W1", "W2"});
+    for (std::size_t length = 0; length < content.size(); ++length) {
+        EXPECT_FALSE(file.isComplete(content.substr(0, length))) << length;
+    }
+    EXPECT_FALSE(file.isComplete("many\n" + content));
+    EXPECT_FALSE(file.isComplete("-1\n"));
+    EXPECT_FALSE(file.isComplete("4294967296\n"));
+    std::string hole = content;
+    hole[5] = '\0';
+    EXPECT_FALSE(file.isComplete(hole)) << "as a file system leaves it after a power failure";
+}
+
+TEST_F(RecordFileTest, CountsTheRecordsOfAnIncompleteFile) {
+    const std::string content = records({"W1", "W2", "W3"});
+    EXPECT_EQ(RecordFile::promisedIn(content), 3U);
+    EXPECT_EQ(file.presentIn(content), 3U);
+    EXPECT_EQ(file.presentIn(content.substr(0, content.size() - 1)), 2U);
+    EXPECT_EQ(file.presentIn("3\n"), 0U);
+    EXPECT_EQ(RecordFile::promisedIn("none"), std::nullopt);
+}
+
+TEST_F(RecordFileTest, AnIncompleteFileIsRestoredFromTheSavedCopy) {
+    writeFile(path, records({"W1"}));
+    prepare();
+    writeFile(path, "2\nW1\n");
+    EXPECT_THAT(file.recover(), AllOf(HasSubstr("Warranty.dat was incomplete (records promised: 2, present: 0)"),
+                                      HasSubstr("restored from the saved copy of 20")));
+    EXPECT_EQ(readFile(path), records({"W1"}));
+    EXPECT_EQ(readFile(damaged), "2\nW1\n");
+    EXPECT_THAT(file.recover(), IsEmpty()) << "it is complete now";
+}
+
+TEST_F(RecordFileTest, ACompleteFileIsReplacedByTheSavedCopyOnRequest) {
+    EXPECT_THAT(file.restoreSaved(), IsEmpty()) << "there is no copy";
+    writeFile(path, records({"W1"}));
+    prepare();
+    writeFile(path, records({"W2"}));
+    EXPECT_THAT(file.defect(), IsEmpty());
+    EXPECT_THAT(file.restoreSaved(), HasSubstr("restored from the saved copy of 20"));
+    EXPECT_EQ(readFile(path), records({"W1"}));
+    EXPECT_EQ(readFile(damaged), records({"W2"}));
+}
+
+TEST_F(RecordFileTest, ReplacedRecordsAreInTheSavedCopyUntilTheNextChange) {
+    writeFile(path, records({"W1"}));
+    file.replace(records({"W2"}));
+    EXPECT_EQ(readFile(path), records({"W2"}));
+    EXPECT_EQ(file.savedCopy().content, records({"W1"}));
+    EXPECT_THAT(file.recover(), IsEmpty());
+    EXPECT_EQ(prepare(), records({"W2"}));
+    EXPECT_EQ(file.savedCopy().content, records({"W2"}));
+}
+
+TEST_F(RecordFileTest, AMissingOrEmptyFileIsRestored) {
+    for (const bool isEmpty : {false, true}) {
+        writeFile(path, records({"W1"}));
+        prepare();
+        fs::remove(path);
+        if (isEmpty) {
+            writeFile(path, "");
+        }
+        EXPECT_THAT(file.recover(), HasSubstr(isEmpty ? "had no count of records" : "was missing"));
+        EXPECT_EQ(readFile(path), records({"W1"}));
+        EXPECT_FALSE(fs::exists(damaged));
+    }
+}
+
+TEST_F(RecordFileTest, ACompleteFileWinsOverANewerSavedCopy) {
+    writeFile(path, records({"W1"}));
+    prepare();
+    writeFile(path, records({"by_hand"}));
+    fs::last_write_time(path, fs::file_time_type::clock::now() - std::chrono::hours(1));
+    EXPECT_THAT(file.recover(), IsEmpty());
+    EXPECT_EQ(readFile(path), records({"by_hand"}));
+    prepare();
+    EXPECT_EQ(file.savedCopy().content, records({"by_hand"}));
+}
+
+TEST_F(RecordFileTest, AnOldSavedCopyIsUsedAndItsTimeIsLogged) {
+    writeFile(path, records({"W1"}));
+    prepare();
+    fs::last_write_time(saved, fs::file_time_type::clock::now() - std::chrono::hours(24 * 365 * 3));
+    writeFile(path, "");
+    const std::string message = file.recover();
+    EXPECT_THAT(message, testing::ContainsRegex("the saved copy of 20[0-9][0-9]-.*Z"));
+    EXPECT_EQ(readFile(path), records({"W1"}));
+}
+
+TEST_F(RecordFileTest, ASavedCopyOfAnotherClassIsNotUsed) {
+    const RecordFile leases = recordFileIn(directory.withSlash(), "Lease.dat");
+    std::string content = "1\n";
+    for (int line = 0; line < 13; ++line) {
+        content += "1\n";
+    }
+    writeFile(in("Lease.dat"), content);
+    leases.prepare(content, false);
+    fs::copy_file(in("Lease.dat.saved1"), saved);
+    writeFile(path, "2\nW1\n");
+    EXPECT_THAT(file.recover(), HasSubstr("no saved copy"));
+    EXPECT_EQ(readFile(path), "2\nW1\n");
+}
+
+TEST_F(RecordFileTest, ASavedCopyThatIsCutIsNotUsed) {
+    writeFile(path, records({"W1", "W2"}));
+    prepare();
+    const std::string complete = readFile(saved);
+    writeFile(path, "2\n");
+    for (std::size_t length = 0; length < complete.size(); ++length) {
+        writeFile(saved, complete.substr(0, length));
+        EXPECT_THAT(file.recover(), HasSubstr("no saved copy")) << length;
+    }
+}
+
+TEST_F(RecordFileTest, WithoutSavedCopyTheIncompleteFileStaysAndIsKept) {
+    writeFile(path, records({"W1", "W2"}).substr(0, 45));
+    EXPECT_THAT(file.recover(), AllOf(HasSubstr("records promised: 2, present: 1"), HasSubstr(damaged.string())));
+    EXPECT_EQ(readFile(path), records({"W1", "W2"}).substr(0, 45));
+    EXPECT_EQ(readFile(damaged), readFile(path));
+}
+
+TEST_F(RecordFileTest, TheOlderCopyIsOverwrittenAndTheNewerOneIsUsed) {
+    writeFile(path, records({"W1"}));
+    prepare();
+    std::string newest = records({"W1"});
+    for (const char* identifier : {"W2", "W3", "W4"}) {
+        const std::string before = newest;
+        newest = records({identifier});
+        writeFile(path, newest);
+        file.commit(newest);
+        EXPECT_EQ(file.savedCopy().content, newest);
+        const fs::path used = file.savedCopy().path;
+        const std::string complete = readFile(used);
+        for (std::size_t length = 0; length < complete.size(); ++length) {
+            writeFile(used, complete.substr(0, length));
+            EXPECT_EQ(file.savedCopy().content, before) << length;
+        }
+        writeFile(used, std::string(complete).replace(3, 1, 1, '\0'));
+        EXPECT_EQ(file.savedCopy().content, before) << "it has a hole";
+        writeFile(used, complete);
+    }
+}
+
+TEST_F(RecordFileTest, AnEmptyFileWithoutSavedCopyHasNoRecords) {
+    writeFile(path, "");
+    EXPECT_THAT(file.recover(), IsEmpty());
+    EXPECT_FALSE(fs::exists(damaged));
+    EXPECT_EQ(prepare(), "0\n");
+}
+
+TEST_F(RecordFileTest, TheTargetOfASymbolicLinkIsProtected) {
+    const testsupport::TempDirectory other;
+    const fs::path target = other.path() / "records";
+    writeFile(target, records({"W1"}));
+    fs::create_symlink(target, path);
+    const RecordFile linked = recordFileIn(directory.withSlash(), "Warranty.dat");
+    linked.prepare(records({"W1"}), false);
+    writeFile(path, "2\n");
+    EXPECT_THAT(linked.recover(), HasSubstr("It was restored"));
+    EXPECT_TRUE(fs::is_symlink(path));
+    EXPECT_EQ(readFile(target), records({"W1"}));
+}
+
+TEST_F(RecordFileTest, WithoutAnyFileThereIsNothingToRecover) {
+    EXPECT_THAT(file.recover(), IsEmpty());
+    EXPECT_TRUE(fs::is_empty(directory.path()));
+}
+
+TEST_F(RecordFileTest, AnUnfinishedChangeIsNotTakenForAnAnsweredOne) {
+    writeFile(path, records({"W1"}));
+    prepare(true);
+    writeFile(path, records({"W1", "W2"}));
+    EXPECT_TRUE(file.needsRecovery());
+    EXPECT_THAT(file.recover(), HasSubstr("held an unfinished change"));
+    EXPECT_EQ(readFile(path), records({"W1"}));
+    EXPECT_THAT(file.recover(), IsEmpty()) << "it is finished now";
+}
+
+TEST_F(RecordFileTest, ACommittedChangeIsSavedAndFinished) {
+    writeFile(path, records({"W1"}));
+    prepare(true);
+    writeFile(path, records({"W1", "W2"}));
+    file.commit(records({"W1", "W2"}));
+    EXPECT_THAT(file.recover(), IsEmpty());
+    EXPECT_EQ(file.savedCopy().content, records({"W1", "W2"}));
+}
+
+TEST_F(RecordFileTest, AChangeIsRolledBackWhateverTheSavedCopyIs) {
+    const std::string before = records({"W1"});
+    const std::string after = records({"W1", "W2"});
+    for (const bool isCommitted : {false, true}) {
+        writeFile(path, before);
+        prepare();
+        writeFile(path, after);
+        if (isCommitted) {
+            file.commit(after);
+        }
+        file.restore(before);
+        EXPECT_EQ(readFile(path), before);
+        EXPECT_THAT(file.recover(), IsEmpty());
+        EXPECT_FALSE(fs::exists(saved) || fs::exists(second)) << "one became the file, the other one is old";
+    }
+}
+
+TEST_F(RecordFileTest, TheSavedCopyHasTheModeOfTheFile) {
+    writeFile(path, records({"W1"}));
+    fs::permissions(path, fs::perms::owner_read | fs::perms::owner_write);
+    prepare();
+    EXPECT_EQ(fs::status(saved).permissions(), fs::perms::owner_read | fs::perms::owner_write);
+}
+
+TEST_F(RecordFileTest, AFileThatCannotBeReadIsAnErrorWithItsName) {
+    fs::create_directory(path);
+    try {
+        file.recover();
+        FAIL() << "a directory was read";
+    } catch (const std::system_error& error) {
+        EXPECT_THAT(error.what(), HasSubstr(path.string()));
+    }
+}
+
+}  // namespace
+}  // namespace durable

@@ -1,0 +1,40 @@
+#pragma once
+
+#include <sys/types.h>
+
+#include <cstddef>
+#include <string>
+#include <vector>
+
+// Records the operations on files of the data directory, also those of the libraries under test.
+
+namespace gatetest {
+
+enum class Kind { create, rename, remove, syncNames, truncate, write, sync };
+
+/** An operation on a file of the data directory. */
+struct Event {
+    Kind kind;
+    ino_t file;            ///< unless removed or the names were synced
+    std::string name{};    ///< of a file that was created, renamed or removed
+    std::string target{};  ///< new name of a renamed file
+    std::string data{};
+    std::size_t size = 0;  ///< after a truncation
+};
+
+/** Returns the number that identifies a file; 0 if there is none. */
+ino_t inodeOf(const std::string& path);
+
+/** Records operations during its lifetime. */
+struct Recording {
+    static inline std::vector<Event>* events = nullptr;
+
+    Recording() { events = &recorded; }
+    ~Recording() { events = nullptr; }
+    Recording(const Recording&) = delete;
+    Recording& operator=(const Recording&) = delete;
+
+    std::vector<Event> recorded;
+};
+
+}  // namespace gatetest

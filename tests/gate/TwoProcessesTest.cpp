@@ -1,0 +1,133 @@
+#include "GateFixture.h"
+#include "durable/DirectoryLock.h"
+#include "support/Files.h"
+
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <functional>
+#include <stdexcept>
+
+// Two processes with the gate on one data directory: one owns it and makes changes, the other reads.
+
+namespace gatetest {
+namespace {
+
+using testing::ElementsAre;
+using testing::HasSubstr;
+
+/** Another process, which runs its tasks on request. */
+class OtherProcess {
+public:
+    explicit OtherProcess(std::vector<std::function<bool()>> tasks) {
+        if (pipe(toOther) != 0 || pipe(fromOther) != 0) {
+            throw std::runtime_error("no pipe");
+        }
+        process = fork();
+        if (process == 0) {
+            close(toOther[1]);
+            for (char task = 0; read(toOther[0], &task, 1) == 1;) {
+                const char isRight = tasks.at(static_cast<std::size_t>(task))() ? 1 : 0;
+                if (write(fromOther[1], &isRight, 1) != 1) {
+                    break;
+                }
+            }
+            _exit(0);
+        }
+    }
+
+    ~OtherProcess() { end(); }
+    OtherProcess(const OtherProcess&) = delete;
+    OtherProcess& operator=(const OtherProcess&) = delete;
+
+    /** Runs a task and returns its result. */
+    bool does(int number) {
+        const char task = static_cast<char>(number);
+        char isRight = 0;
+        return write(toOther[1], &task, 1) == 1 && read(fromOther[0], &isRight, 1) == 1 && isRight == 1;
+    }
+
+    pid_t id() const { return process; }
+
+    void end() {
+        if (process != 0) {
+            for (const int each : {toOther[0], toOther[1], fromOther[0], fromOther[1]}) {
+                close(each);
+            }
+            waitpid(process, nullptr, 0);
+            process = 0;
+        }
+    }
+
+private:
+    int toOther[2]{};
+    int fromOther[2]{};
+    pid_t process = 0;
+};
+
+using TwoProcessesTest = GateTest;
+
+TEST_F(TwoProcessesTest, OneReadsWhatTheOtherStores) {
+    OtherProcess owner({[&] { return create("L1", {named("LeaseTerm", uint32(1))}).rc == CMPI_RC_OK; },
+                        [&] { return modify("L1", {named("LeaseTerm", uint32(2))}).rc == CMPI_RC_OK; }});
+    ASSERT_TRUE(owner.does(0));
+    EXPECT_EQ(valueIn(instanceOf("L1"), "LeaseTerm"), "1");
+    ASSERT_TRUE(owner.does(1));
+    EXPECT_EQ(valueIn(instanceOf("L1"), "LeaseTerm"), "2");
+}
+
+TEST_F(TwoProcessesTest, AChangeIsRefusedWithTheNameOfTheOwnerUntilItEnds) {
+    OtherProcess owner({[&] { return create("L1").rc == CMPI_RC_OK; }, [&] { return create("L2").rc == CMPI_RC_OK; }});
+    ASSERT_TRUE(owner.does(0));
+    const Outcome refused = create("L3");
+    EXPECT_THAT(refused, isRefused(CMPI_RC_ERR_FAILED, "process " + std::to_string(owner.id()) + " (gate_test)"));
+    EXPECT_THAT(refused.message, HasSubstr(agentEnvironment::dataDirectory().string()));
+    ASSERT_TRUE(owner.does(1));
+    owner.end();
+    EXPECT_THAT(create("L4"), isAnswered(1));
+    EXPECT_THAT(identifiers(), ElementsAre("L1", "L2", "L4"));
+    unload();
+    EXPECT_THAT(identifiers(), ElementsAre("L1", "L2", "L4"));
+}
+
+TEST_F(TwoProcessesTest, AnOwnerThatLosesTheLockReadsTheFilesAgain) {
+    OtherProcess other({[&] { return create("L2").rc == CMPI_RC_OK; }});
+    create("L1");
+    std::filesystem::remove(dataFile("owner"));
+    ASSERT_TRUE(other.does(0));
+    EXPECT_THAT(create("L3"), isRefused(CMPI_RC_ERR_FAILED, "is in use by process"));
+    EXPECT_THAT(identifiers(), ElementsAre("L1", "L2"));
+    other.end();
+    EXPECT_THAT(create("L3"), isAnswered(1));
+    EXPECT_THAT(identifiers(), ElementsAre("L1", "L2", "L3"));
+}
+
+TEST_F(TwoProcessesTest, AnOwnerThatRegainsALostLockReadsTheFilesAgain) {
+    OtherProcess other({[&] { return create("L2").rc == CMPI_RC_OK; }});
+    create("L1");
+    std::filesystem::remove(dataFile("owner"));
+    ASSERT_TRUE(other.does(0));
+    other.end();
+    EXPECT_THAT(create("L3"), isAnswered(1));
+    EXPECT_THAT(identifiers(), ElementsAre("L1", "L2", "L3"));
+}
+
+TEST_F(TwoProcessesTest, TheFileOfAnEarlierOwnerLocksNothing) {
+    create("L1");
+    unload();
+    EXPECT_THAT(testsupport::readFile(dataFile("owner")), HasSubstr("gate_test"));
+    OtherProcess other({[&] { return create("L2").rc == CMPI_RC_OK; }});
+    EXPECT_TRUE(other.does(0));
+}
+
+TEST_F(TwoProcessesTest, AForkedChildDoesNotKeepTheLock) {
+    create("L1");
+    OtherProcess child({[&] { return true; }});  // has inherited all files of this process
+    unload();
+    OtherProcess other({[&] { return create("L2").rc == CMPI_RC_OK; }});
+    EXPECT_TRUE(other.does(0));
+    EXPECT_TRUE(child.does(0)) << "it is still there";
+}
+
+}  // namespace
+}  // namespace gatetest
