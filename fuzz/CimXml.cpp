@@ -129,7 +129,7 @@ void requireRoundTrip(const Schema& schema, const Instance& instance) {
 
 int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     Server server;
-    const std::string text = server.respond(fuzz::textOf(data, size));
+    const std::string text = server.respond(fuzz::inputOf(data, size));
     if (!text.empty()) {
         const cimxml::XmlElement root = cimxml::parseXml(text);
         requireSame(root.name, std::string("CIM"), "root of the response");

@@ -53,7 +53,7 @@ void requireRefusal(const HttpResponse& response) {
 }  // namespace
 
 int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-    const HttpRequest request = requestFrom(fuzz::textOf(data, size));
+    const HttpRequest request = requestFrom(fuzz::inputOf(data, size));
     const bool isLocal = size % 2 == 0;
     const auto checked = checkHeaders(request, {isLocal, 1000});
     if (const auto* accepted = std::get_if<CimHeaders>(&checked)) {

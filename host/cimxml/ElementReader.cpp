@@ -11,7 +11,7 @@
 #include "schema/CimType.h"
 #include "schema/Errors.h"
 #include "schema/Literal.h"
-#include "schema/Text.h"
+#include "schema/StringLiteral.h"
 
 namespace cimhost::cimxml {
 namespace {
@@ -84,14 +84,15 @@ Literal booleanFrom(const std::string& characters) {
 }
 
 Literal literalFrom(const std::string& characters, CMPIType type) {
-    std::uint16_t code = 0;
     switch (type) {
         case CMPI_string:
         case CMPI_dateTime:
             return {characters, characters};
         case CMPI_char16:
-            return singleCharacter(characters, code) ? Literal{Char16{code}, characters}
-                                                     : Literal{characters, characters};
+            if (const std::optional<std::uint16_t> code = singleCharacter(characters)) {
+                return {Char16{*code}, characters};
+            }
+            return {characters, characters};
         case CMPI_boolean:
             return booleanFrom(characters);
         default:

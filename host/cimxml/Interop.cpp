@@ -1,7 +1,7 @@
 #include "cimxml/Interop.h"
 
 #include "schema/MofReader.h"
-#include "schema/Text.h"
+#include "schema/StringLiteral.h"
 
 namespace cimhost::cimxml {
 namespace {

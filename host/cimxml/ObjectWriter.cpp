@@ -30,7 +30,7 @@ struct Characters {
         return string;
     }
     std::string operator()(const std::string& string) const { return string; }
-    std::string operator()(const DateTime& dateTime) const { return dateTime.text; }
+    std::string operator()(const DateTime& dateTime) const { return dateTime.value; }
     std::string operator()(const std::shared_ptr<const ObjectPath>&) const { return {}; }
     std::string operator()(const std::shared_ptr<const Instance>&) const { return {}; }
     template <class Number>
@@ -85,7 +85,7 @@ void requireRepresentable(const Value& value, const std::string& className, cons
                            "The value of " + className + "." + name + " has a character that XML cannot represent.");
         }
         if (const auto* dateTime = std::get_if<DateTime>(&scalar); dateTime != nullptr) {
-            requireRepresentable(Value::of(dateTime->text), className, name);
+            requireRepresentable(Value::of(dateTime->value), className, name);
         }
         if (const ObjectPath* path = referenceIn(scalar)) {
             cimxml::requireRepresentable(*path);
