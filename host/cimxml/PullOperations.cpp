@@ -41,7 +41,8 @@ void refuseUnsupported(const OperationArguments& arguments) {
 OperationResult Operations::open(const Call& call, ResultCursor cursor) {
     const EnumerationLimits& limits = options.limits;
     const auto asked = call.arguments.number("OperationTimeout");
-    const std::chrono::seconds timeout = asked ? std::chrono::seconds(*asked) : std::min(limits.timeout, limits.longestTimeout);
+    const std::chrono::seconds timeout =
+        asked ? std::chrono::seconds(*asked) : std::min(limits.timeout, limits.longestTimeout);
     if (timeout > limits.longestTimeout || timeout.count() == 0) {  // 0 asks for an enumeration that never times out
         throw CimError(invalidOperationTimeout, "OperationTimeout must be from 1 to " +
                                                     std::to_string(limits.longestTimeout.count()) + " seconds.");

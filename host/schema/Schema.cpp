@@ -87,8 +87,8 @@ std::vector<Property> mergeProperties(const Class& declared, const Class& super)
 std::vector<Method> mergeMethods(const Class& declared, const Class& super) {
     std::vector<Method> merged = declared.methods;
     for (const Method& inherited : super.methods) {
-        const auto overriding = std::find_if(merged.begin(), merged.end(),
-                                             [&](const Method& own) { return cim::sameName(own.name, inherited.name); });
+        const auto overriding = std::find_if(
+            merged.begin(), merged.end(), [&](const Method& own) { return cim::sameName(own.name, inherited.name); });
         if (overriding != merged.end()) {
             inheritQualifiers(overriding->qualifiers, inherited.qualifiers);
             continue;

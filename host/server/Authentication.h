@@ -25,7 +25,7 @@ public:
     virtual bool accepts(const Credentials& credentials) = 0;
 };
 
-/** Authenticates users of the operating system through a PAM service. One attempt runs at a time. */
+/** Authenticates users of the operating system through a PAM service. Attempts are serialised. */
 class PamAuthenticator : public Authenticator {
 public:
     /** @param itsDirectory with the file of the service; empty: the system's directory */

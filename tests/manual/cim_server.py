@@ -9,7 +9,7 @@ import subprocess
 import urllib.parse
 import xml.etree.ElementTree as xml
 
-from surroundings import Surroundings
+from environment import Environment
 
 HEADERS = {"Content-Type": 'application/xml; charset="utf-8"', "CIMOperation": "MethodCall"}
 
@@ -37,19 +37,19 @@ def headers_for(operation, namespace="root/cimv2", **changed):
 class CimServer:
     """A server with the gate, or with other providers, until it is left.
 
-    @param surroundings  with the agent and the programs
+    @param environment  with the agent and the programs
     @param options       of cimhost serve, besides the address
     @param provider      options that name other schemas and registrations"""
 
-    def __init__(self, surroundings, *options, tls=False, provider=()):
-        data = surroundings.build / "share" / "lease-warranty-provider"
-        provider = provider or ("--schema", data / "velko.mof", "--library-path", surroundings.libraries(),
+    def __init__(self, environment, *options, tls=False, provider=()):
+        data = environment.build / "share" / "lease-warranty-provider"
+        provider = provider or ("--schema", data / "velko.mof", "--library-path", environment.libraries(),
                                 "--registration", data / "gate" / "LeaseAndWarrantyGate.reg",
                                 "--registration", data / "OstrelComputerSystemProvider.reg")
         listen = ("--listen-tls" if tls else "--listen", "127.0.0.1:0")
-        self.log = surroundings.directory / "serve.log"
+        self.log = environment.directory / "serve.log"
         self.command = [str(word) for word in ("cimhost", *provider, "serve", *listen, *options)]
-        self.environment = surroundings.environment
+        self.environment = environment.environment
         self.tls = tls
         self.context = ssl.create_default_context()
         self.context.check_hostname = False
@@ -117,7 +117,7 @@ def read_all(client):
         received += part
 
 
-class Machine(Surroundings):
+class Machine(Environment):
     """With a number of leases.
 
     @param build  the build tree, or an installation"""
