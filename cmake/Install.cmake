@@ -1,4 +1,4 @@
-# Installation directories and components. The components are provider, agent, host and development.
+# Installation directories and components. The components are provider, agent, host, development, and those of fleet/.
 include(GNUInstallDirs)
 
 set(LAW_PROVIDER_DIRECTORY ${CMAKE_INSTALL_LIBDIR}/cmpi)

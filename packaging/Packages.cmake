@@ -9,7 +9,7 @@ set(CPACK_PACKAGE_DIRECTORY ${PROJECT_BINARY_DIR}/packages)
 set(CPACK_PACKAGE_CONTACT "Lease and Warranty Provider developers <developers@lease-warranty-provider.example>")
 # Each package has a separate summary.
 set(CPACK_PACKAGE_DESCRIPTION_SUMMARY "")
-set(CPACK_COMPONENTS_ALL provider agent host development)
+set(CPACK_COMPONENTS_ALL provider agent host development fleet facts metrics report)
 set(CPACK_DEB_COMPONENT_INSTALL ON)
 set(CPACK_DEBIAN_PACKAGE_RELEASE 1)
 set(CPACK_DEBIAN_FILE_NAME DEB-DEFAULT)
@@ -65,6 +65,10 @@ endmacro()
 # Documents that are not in the provider's package.
 set(package_of_agent.md ostrel-reference-agent)
 set(package_of_cimhost.md cimhost)
+set(package_of_fleet.md lease-warranty-fleet-common)
+set(package_of_lease-warranty-export.md lease-warranty-facts)
+set(package_of_lease-warranty-metrics.md lease-warranty-metrics)
+set(package_of_lease-warranty-report.md lease-warranty-report)
 file(GLOB linked CONFIGURE_DEPENDS RELATIVE ${PROJECT_SOURCE_DIR}/docs ${PROJECT_SOURCE_DIR}/docs/*.md)
 
 # law_install_document(<name> <package> <component>)
@@ -148,5 +152,7 @@ law_package(development lease-warranty-provider-dev
     DESCRIPTION "headers to build CMPI providers with
 The CMPI 2.0 headers, the declarations of the agent's framework and logging
 library, and the files with which CMake and pkg-config find them.")
+
+include(${CMAKE_CURRENT_LIST_DIR}/FleetPackages.cmake)
 
 include(CPack)

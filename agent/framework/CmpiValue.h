@@ -14,7 +14,7 @@ namespace KO {
  */
 ///@{
 std::optional<std::string> textOf(const CMPIData& data, const CMPIStatus& status);          ///< a string
-std::optional<std::string> dateTimeTextOf(const CMPIData& data, const CMPIStatus& status);  ///< a datetime's text
+std::optional<std::string> dateTimeTextOf(const CMPIData& data, const CMPIStatus& status);  ///< a datetime's string
 std::optional<unsigned int> numberOf(const CMPIData& data, const CMPIStatus& status);       ///< any integer that fits
 std::optional<bool> flagOf(const CMPIData& data, const CMPIStatus& status);                 ///< a boolean
 

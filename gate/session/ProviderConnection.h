@@ -46,7 +46,7 @@ private:
     CMPIAssociationMI* associations = nullptr;
     mutable std::mutex mutex{};  ///< of the members below, for callers without the request lock
     const CMPIBroker* managersOwn = nullptr;
-    CMPIBroker tables{};  ///< a copy of the broker, as it was when the provider was connected
+    CMPIBroker tables{};  ///< a copy of the broker, made when the provider was connected
 };
 
 extern ProviderConnection theConnection;

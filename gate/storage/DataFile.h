@@ -36,7 +36,7 @@ struct DataFile {
 
     FileState state() const;
 
-    /** Whether the content of a record file has as many lines as its head says. */
+    /** Whether the content of a record file has as many lines as its count requires. */
     bool isComplete(std::string_view content) const;
 
     /**

@@ -20,8 +20,8 @@ Values diff(const CMPIInstance* current, const Values& given, bool areListed);
 Values valuesToSend(const Class& owner, const CMPIInstance* current, const Values& changes);
 
 /**
- * The values that undo the changes, from the instance as it was. For a property file these are all of its values: a
- * change that cannot read the file empties the others.
+ * The values that reverse the changes, from the instance before them. For a property file these are all of its values:
+ * a change that cannot read the file empties the others.
  */
 Values rollbackValues(const Class& owner, const DataFile& file, const Values& changes, const CMPIInstance* current);
 

@@ -68,7 +68,7 @@ TEST_F(LifetimeTest, ACloneOutlivesItsRequestUntilItIsReleased) {
         const CMPIObjectPath* path = copy->ft->getObjectPath(copy, &status);
         EXPECT_EQ(characters(path->ft->getClassName(path, nullptr)), "A");
         EXPECT_EQ(copy->ft->release(copy).rc, CMPI_RC_OK);
-        EXPECT_EQ(copy->ft->release(copy).rc, CMPI_RC_ERR_INVALID_HANDLE) << "told as long as the request goes on";
+        EXPECT_EQ(copy->ft->release(copy).rc, CMPI_RC_ERR_INVALID_HANDLE) << "detected until the request ends";
     }
     EXPECT_EQ(broker.lasting().size(), 0U);
 }

@@ -10,7 +10,7 @@ namespace {
 
 const CMPIBroker* theBroker = nullptr;
 
-/** Also for a code that is not a CMPIrc, which a provider written in C may return. */
+/** Returns a status with any code: a provider written in C may return one that is not a CMPIrc. */
 CMPIStatus status(int code, const char* message = nullptr) {
     CMPIStatus result{CMPI_RC_OK, nullptr};
     static_assert(sizeof result.rc == sizeof code);

@@ -9,9 +9,9 @@
 namespace cimhost::lab {
 
 /**
- * A client that sends requests about its own instances, one after the other, and knows the right response to each.
- * Sometimes it requests an instance that does not exist, or creates one that exists. The manager, the plan and the
- * initial state are shared and must outlive it.
+ * A client that sends requests about its own instances, one after the other, and checks each response. Sometimes it
+ * requests an instance that does not exist, or creates one that exists. The manager, the plan and the initial state are
+ * shared and must outlive it.
  */
 class Client {
 public:

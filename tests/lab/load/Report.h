@@ -80,7 +80,7 @@ struct Report {
     std::vector<WrongResponse> first{};
 };
 
-/** The percentile of some times; 0 if there are none. @param share from 0 to 1 */
+/** Returns a percentile of the times; 0 if there are none. @param share from 0 to 1 */
 double percentile(const std::vector<Statistics::Time>& sorted, double share);
 
 /** Calculates the figures of a report. */

@@ -1,0 +1,75 @@
+"""Reads the data of many machines: exports, Ansible's facts cache, and the trees of its module setup."""
+
+import collections
+import json
+
+from . import machine
+from .cimhost import Unreadable
+from .kinds import KINDS
+
+# data: as read_machine() returns it, or None; reason: why there is none
+Machine = collections.namedtuple("Machine", "name data reason")
+NO_FACT = "The facts have no lease_warranty. Is the package lease-warranty-facts installed?"
+
+
+def checked(data):
+    """The data of a machine.
+    @throws ValueError if they have another form"""
+    if not isinstance(data, dict) or data.get("format") != machine.FORMAT:
+        raise ValueError(f"not an export in format {machine.FORMAT}")
+    for name in ("asset", "agent"):
+        if not isinstance(data.get(name), dict):
+            raise ValueError(f"{name} is not an object")
+    for name in KINDS:
+        records = data.get(name)
+        if not isinstance(records, list) or not all(isinstance(each, dict) for each in records):
+            raise ValueError(f"{name} is not a list of objects")
+    return data
+
+
+def machine_of(name, document):
+    """@throws ValueError"""
+    facts = document.get("ansible_facts", document) if isinstance(document, dict) else {}
+    if not any(key.startswith(("ansible_", "module_setup", "gather_subset")) for key in facts):
+        return Machine(name, checked(document), "")
+    local = facts.get("ansible_local")
+    fact = local.get("lease_warranty") if isinstance(local, dict) else None
+    if fact is None or isinstance(fact, str):
+        return Machine(name, None, fact or NO_FACT)
+    return Machine(name, checked(fact), "")
+
+
+def read_file(path):
+    try:
+        return machine_of(path.name.removesuffix(".json"), json.loads(path.read_text(encoding="utf-8")))
+    except (OSError, ValueError) as error:
+        raise Unreadable(f"{path} cannot be read: {error}") from error
+
+
+def files_of(source):
+    """A file, or the files of a directory that are not hidden."""
+    try:
+        return sorted(each for each in source.iterdir() if not each.name.startswith(".")) if source.is_dir() else [source]
+    except OSError as error:
+        raise Unreadable(f"{source} cannot be read: {error.strerror}") from error
+
+
+def read_machines(sources, expected=(), skip_unreadable=False):
+    """The machines by name.
+
+    @param expected         names of machines that should have data
+    @param skip_unreadable  report a file that cannot be read as a machine without data"""
+    found = {}
+    for path in (path for source in sources for path in files_of(source)):
+        try:
+            one = read_file(path)
+        except Unreadable as error:
+            if not skip_unreadable:
+                raise
+            one = Machine(path.name.removesuffix(".json"), None, str(error))
+        if one.name in found:
+            raise Unreadable(f"{path}: {one.name} is in another source, too.")
+        found[one.name] = one
+    for name in expected:
+        found.setdefault(name, Machine(name, None, "There is no file of this machine."))
+    return found

@@ -1,0 +1,32 @@
+"""How each tool ends: 0 for success, 1 with the reason if it failed, 2 for wrong usage."""
+
+import argparse
+import sys
+
+from . import terms
+from .cimhost import Unreadable
+from .kinds import KINDS
+
+
+def new_parser(name, description):
+    return argparse.ArgumentParser(prog=name, description=description,
+                                   formatter_class=argparse.RawDescriptionHelpFormatter)
+
+
+def add_unit_options(parser):
+    for kind in KINDS.values():
+        parser.add_argument(f"--{kind.name}-unit", choices=terms.UNITS, default="months",
+                            help=f"unit of {kind.term}; months and years are those of the calendar (default: months)")
+
+
+def units_of(arguments):
+    return {name: getattr(arguments, f"{kind.name}_unit") for name, kind in KINDS.items()}
+
+
+def run(main, name):
+    """Runs the main function and ends the process."""
+    try:
+        main()
+    except (Unreadable, OSError) as error:
+        print(f"{name}: {error}", file=sys.stderr)
+        sys.exit(1)
