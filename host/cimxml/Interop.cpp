@@ -75,7 +75,7 @@ Schema interopSchema(const std::string& host, const std::string& version, const 
         }
     }
     Schema schema;
-    MofReader(schema).readText(mof, "classes of the interop namespace");
+    MofReader(schema).readSource(mof, "classes of the interop namespace");
     return schema;
 }
 

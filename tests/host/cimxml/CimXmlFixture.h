@@ -59,7 +59,7 @@ inline Instance instanceOf(const std::string& className, const std::string& name
 class CimXmlTest : public testing::Test {
 protected:
     CimXmlTest() {
-        MofReader(schema).readText(testClasses, "test classes");
+        MofReader(schema).readSource(testClasses, "test classes");
         for (const char* name : {"Base", "Derived", "Other", "Link"}) {
             registry.add({name, "Test", "Test", true, std::string(name) == "Link", {"root/test"}, "", "", ""});
         }

@@ -34,7 +34,7 @@ public:
 class RequestHandlerTest : public testing::Test {
 protected:
     RequestHandlerTest() {
-        MofReader(schema).readText("class Thing { [Key] string Name; };", "test class");
+        MofReader(schema).readSource("class Thing { [Key] string Name; };", "test class");
         registry.add({"Thing", "Test", "Test", true, false, {"root/test"}, "", "", ""});
         settings.access = {{"reader"}, {"writer"}};
         settings.limits.failureDelay = std::chrono::milliseconds(0);
