@@ -105,10 +105,13 @@ private:
 }  // namespace
 
 OperationResult Operations::getClass(const Call& call) {
-    const Class& found = classOf(call, call.arguments.requiredClassName("ClassName"));
-    return listed(Classes{&found},
-                  [writer = writerFor(call), parts = classPartsOf(call.arguments, true, true)](
-                      std::string& xml, const Class* each) { appendClass(xml, *each, parts, writer); });
+    const std::string name = call.arguments.requiredClassName("ClassName");
+    const Class* found = call.schema.findClass(name);
+    if (found == nullptr) {
+        throw CimError(CMPI_RC_ERR_NOT_FOUND, "There is no class " + name + ".");
+    }
+    return listed(Classes{found}, [writer = writerFor(call), parts = classPartsOf(call.arguments, true, true)](
+                                      std::string& xml, const Class* each) { appendClass(xml, *each, parts, writer); });
 }
 
 OperationResult Operations::enumerateClasses(const Call& call) {

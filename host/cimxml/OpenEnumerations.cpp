@@ -31,7 +31,7 @@ std::string randomIdentifier() {
 std::optional<std::string> OpenEnumerations::keep(OpenEnumeration enumeration, std::string identifier,
                                                   Clock::time_point now) {
     const std::lock_guard<std::mutex> lock(mutex);
-    removeExpired(now);
+    erase(now);
     if (identifier.empty()) {
         if (kept.size() >= limits.open) {
             return std::nullopt;
@@ -46,7 +46,7 @@ std::optional<std::string> OpenEnumerations::keep(OpenEnumeration enumeration, s
 std::optional<OpenEnumeration> OpenEnumerations::take(const std::string& identifier, const std::string& nameSpace,
                                                       const std::string& principal, Clock::time_point now) {
     const std::lock_guard<std::mutex> lock(mutex);
-    removeExpired(now);
+    erase(now);
     const auto found = kept.find(identifier);
     if (found == kept.end() || !cim::sameName(found->second.enumeration.nameSpace, nameSpace) ||
         found->second.enumeration.principal != principal) {
@@ -63,6 +63,12 @@ std::size_t OpenEnumerations::size() const {
 }
 
 void OpenEnumerations::removeExpired(Clock::time_point now) {
+    const std::lock_guard<std::mutex> lock(mutex);
+    erase(now);
+}
+
+/** Erases expired enumerations, with the mutex locked. */
+void OpenEnumerations::erase(Clock::time_point now) {
     for (auto each = kept.begin(); each != kept.end();) {
         each = each->second.expires <= now ? kept.erase(each) : std::next(each);
     }

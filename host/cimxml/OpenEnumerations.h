@@ -69,6 +69,9 @@ public:
     std::optional<OpenEnumeration> take(const std::string& identifier, const std::string& nameSpace,
                                         const std::string& principal, Clock::time_point now);
 
+    /** Frees the results of enumerations whose timeout has passed. */
+    void removeExpired(Clock::time_point now);
+
     std::size_t size() const;
 
 private:
@@ -77,7 +80,7 @@ private:
         Clock::time_point expires;
     };
 
-    void removeExpired(Clock::time_point now);
+    void erase(Clock::time_point now);
 
     EnumerationLimits limits;
     mutable std::mutex mutex;

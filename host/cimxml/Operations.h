@@ -53,6 +53,9 @@ public:
      */
     OperationResult perform(const Message& message, const Caller& caller);
 
+    /** Frees the results of open enumerations whose timeout has passed. To be called from time to time. */
+    void removeExpired() { enumerations.removeExpired(OpenEnumerations::Clock::now()); }
+
     /** The class that a message is about, for the access log; empty if there is none. */
     static std::string subjectOf(const Message& message);
 

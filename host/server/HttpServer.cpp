@@ -331,6 +331,7 @@ void HttpServer::watch() {
     std::unique_lock<std::mutex> lock(mutex);
     while (!ending.wait_for(lock, period, [&] { return isEnding; })) {
         table.endOverdue(std::chrono::steady_clock::now());
+        handler.removeExpired();
     }
 }
 

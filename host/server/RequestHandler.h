@@ -54,6 +54,9 @@ public:
     /** Writes the access log line. */
     void log(Exchange& exchange, unsigned httpStatus) const;
 
+    /** Ends open enumerations whose timeout has passed. */
+    void removeExpired() { operations.removeExpired(); }
+
     /** From now on, requests are answered with 503. */
     void stop() { stopping = true; }
     bool isStopping() const { return stopping; }

@@ -68,7 +68,7 @@ TEST_F(ClassOperationsTest, ClassesHaveDefaultsReferencesAndMethods) {
 }
 
 TEST_F(ClassOperationsTest, UnknownClassesAndQualifiersAreErrors) {
-    EXPECT_EQ(statusOf(response("GetClass", className("ClassName", "Nothing"))), CMPI_RC_ERR_INVALID_CLASS);
+    EXPECT_EQ(statusOf(response("GetClass", className("ClassName", "Nothing"))), CMPI_RC_ERR_NOT_FOUND);
     EXPECT_EQ(statusOf(response("EnumerateClassNames", className("ClassName", "Nothing"))), CMPI_RC_ERR_INVALID_CLASS);
     EXPECT_EQ(statusOf(response("GetQualifier", value("QualifierName", "Nothing"))), CMPI_RC_ERR_NOT_FOUND);
 }

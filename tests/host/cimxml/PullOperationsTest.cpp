@@ -114,6 +114,11 @@ TEST(OpenEnumerationsTest, EnumerationsExpireAfterTheirTimeout) {
     ASSERT_TRUE(identifier);
     EXPECT_FALSE(enumerations.take(*identifier, "root/test", "", start + std::chrono::seconds(5)));
     EXPECT_EQ(enumerations.size(), 0U);
+    enumerations.keep(enumeration, "", start);
+    enumerations.removeExpired(start + std::chrono::seconds(4));
+    EXPECT_EQ(enumerations.size(), 1U);
+    enumerations.removeExpired(start + std::chrono::seconds(5));
+    EXPECT_EQ(enumerations.size(), 0U);
     const auto another = enumerations.keep(enumeration, "", start);
     EXPECT_TRUE(enumerations.take(*another, "ROOT/test", "", start + std::chrono::seconds(4)));
     EXPECT_NE(*identifier, *another);
