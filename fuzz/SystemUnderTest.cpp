@@ -77,7 +77,7 @@ private:
     std::size_t kind = 0;
 };
 
-cimhost::ClassInfoLookup classes() {
+cimhost::ClassInfoLookup schemaClasses() {
     static const cimhost::ClassInfoLookup known = [] {
         cimhost::Schema schema;
         cimhost::MofReader(schema).readFile(SCHEMA_MOF);
@@ -94,7 +94,7 @@ struct Manager {
     }
 
     Computers computers{};
-    cimhost::Broker broker{{classes(), &computers, {}, nullptr, true}};
+    cimhost::Broker broker{{schemaClasses(), &computers, {}, nullptr, true}};
     Interfaces interfaces = openInterfaces(broker.handle());
 };
 

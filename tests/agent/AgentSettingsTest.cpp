@@ -24,8 +24,6 @@ protected:
     Agent::Problems problems;
 };
 
-}  // namespace
-
 TEST_F(AgentSettingsTest, HaveDefaults) {
     const AgentSettings settings = read("");
     EXPECT_EQ(settings.installDirectory, "/usr/lib/ostrel/");
@@ -170,3 +168,5 @@ TEST_F(AgentSettingsTest, ReadFlagsByTableAndKey) {
     EXPECT_THAT(read("[gate]\nrefuse_lossy_values = 1\nrefuse = true\n").flags, IsEmpty());
     EXPECT_THAT(problems, testing::SizeIs(2));
 }
+
+}  // namespace

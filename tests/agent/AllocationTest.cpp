@@ -40,8 +40,6 @@ protected:
     void SetUp() override { ::setenv("OSTREL_CONFIG", "/no/such/file", 1); }
 };
 
-}  // namespace
-
 TEST_F(Allocation, IsAlsoCountedInTheLibrary) {
     const long before = allocations;
     { const RZLog::RZMessageBuffer buffer; }
@@ -71,3 +69,5 @@ TEST_F(Allocation, IsNotNeededForAReusedBuffer) {
     useBuffer();
     EXPECT_EQ(allocations, before);
 }
+
+}  // namespace

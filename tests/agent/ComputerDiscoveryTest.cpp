@@ -30,8 +30,6 @@ protected:
     Agent::Problems problems;
 };
 
-}  // namespace
-
 TEST_F(ComputerDiscoveryTest, FindsTheSystemAndBelowItTheComputer) {
     const NodeTree tree = KO::discoverComputer(dmi.path(), "host1", problems);
     ASSERT_EQ(tree.nodes().size(), 2U);
@@ -113,3 +111,5 @@ TEST_F(ComputerDiscoveryTest, ReportsUnreadableFiles) {
 TEST(HostName, IsNotEmpty) {
     EXPECT_NE(KO::hostName(), "");
 }
+
+}  // namespace

@@ -33,8 +33,6 @@ protected:
     agent_test::TemporaryDirectory directory;
 };
 
-}  // namespace
-
 TEST_F(ConfigurationInProcess, MayBeMissing) {
     const ProbeResult result = runProbe(directory.file("none.toml"), {"show"});
     EXPECT_EQ(result.exitCode, 0);
@@ -108,3 +106,5 @@ TEST_F(ConfigurationInProcess, IsUsableWhileStaticObjectsAreDestroyed) {
     EXPECT_EQ(result.output, "/srv/agent/\n");
     EXPECT_THAT(directory.read("agent.log"), HasSubstr("\tat exit\n"));
 }
+
+}  // namespace

@@ -42,8 +42,6 @@ protected:
     const std::string large = std::string(3000, 'x');  // two of these exceed the rotation size
 };
 
-}  // namespace
-
 TEST_F(LogFileTest, NumbersRotatedFilesBeforeTheExtension) {
     const auto sink = open("agent.log");
     for (const char* text : {"first", "second", "third", "fourth"}) {
@@ -94,3 +92,5 @@ TEST_F(LogFileTest, DoesNotFollowASymbolicLink) {
     EXPECT_THROW(open("agent.log"), std::system_error);
     EXPECT_EQ(directory.read("target"), "");
 }
+
+}  // namespace

@@ -44,8 +44,6 @@ protected:
 
 const std::string timeFields = R"([0-9]{4}-[0-9]{2}-[0-9]{2}T[0-9:]{8}\.[0-9]{6}[+-][0-9]{2}:[0-9]{2})";
 
-}  // namespace
-
 TEST_F(LogInProcess, WritesARecordToEachChannel) {
     run(toFile(), {"log", "3000", "Ostrel.Test", "some text"});
     EXPECT_THAT(lines(),
@@ -175,3 +173,5 @@ TEST_F(LogInProcess, ReportsProblemsOfItsSettings) {
     EXPECT_THAT(lines()[0], HasSubstr("configuration key log.log_level must be an integer"));
     EXPECT_THAT(lines()[1], HasSubstr("configuration key log.colour is unknown"));
 }
+
+}  // namespace

@@ -22,8 +22,6 @@ protected:
     Agent::Problems problems;
 };
 
-}  // namespace
-
 TEST_F(LogSettingsTest, HaveDefaults) {
     const LogSettings settings = read("");
     EXPECT_EQ(settings.destination, LogSettings::Destination::none);
@@ -92,3 +90,5 @@ TEST_F(LogSettingsTest, ReportProblems) {
                             "configuration key log.logger[0].name is missing; ignored",
                             "configuration key log.colour is unknown; ignored"));
 }
+
+}  // namespace

@@ -67,8 +67,6 @@ protected:
     CMPIInstanceMI* mi = OstrelComputerSystemProvider_Create_InstanceMI(host.handle(), context, nullptr);
 };
 
-}  // namespace
-
 TEST_F(OstrelComputerSystemProviderTest, ReturnsItsInterface) {
     CMPIStatus status{CMPI_RC_ERR_FAILED, nullptr};
     const CMPIInstanceMI* interface = OstrelComputerSystemProvider_Create_InstanceMI(host.handle(), context, &status);
@@ -201,3 +199,5 @@ TEST_F(OstrelComputerSystemProviderTest, ServesConcurrentRequests) {
     }
     EXPECT_THAT(counts, ElementsAre(100U, 100U, 100U, 100U));
 }
+
+}  // namespace

@@ -30,8 +30,6 @@ protected:
     PropertyFile file{path(directory.file("asset.dat"))};
 };
 
-}  // namespace
-
 TEST_F(PropertyFileTest, KeepsStringsAndDates) {
     const DateTime date = Utils::convertStringToDateTime("20240229123456.000789-330");
     file.open(3);
@@ -170,3 +168,5 @@ TEST_F(PropertyFileTest, IsClosedAndUnchangedWhenItCannotBeCommitted) {
     EXPECT_NO_THROW(file.close());
     EXPECT_TRUE(std::filesystem::is_directory(directory.file("asset.dat")));
 }
+
+}  // namespace

@@ -126,8 +126,6 @@ protected:
     std::string text;
 };
 
-}  // namespace
-
 TEST_F(Quirks, ANullStateOverridesTheValue) {
     EXPECT_FALSE(readsText(stringData(&withoutCharacters.object, CMPI_nullValue)));
     EXPECT_FALSE(readsText(stringData(&good.object, CMPI_nullValue)));
@@ -234,8 +232,6 @@ TEST_F(Quirks, ANullNameReadsAndWritesNothing) {
     EXPECT_EQ(path.answers.calls + instance.answers.calls, 0);
 }
 
-namespace {
-
 /** Calls all functions that take a path, an instance or a broker; none may crash. */
 void exerciseEverything(CMPIObjectPath* path, CMPIInstance* instance, const CMPIBroker* broker) {
     std::string value = "kept";
@@ -272,8 +268,6 @@ void exerciseEverything(CMPIObjectPath* path, CMPIInstance* instance, const CMPI
     EXPECT_TRUE(flag);
 }
 
-}  // namespace
-
 TEST(MissingParts, NullObjectsAreHarmless) {
     exerciseEverything(nullptr, nullptr, nullptr);
     EXPECT_EQ(ProviderUtilities::getClassId(static_cast<const char*>(nullptr)), 0);
@@ -297,8 +291,6 @@ TEST(MissingParts, NullFunctionsAreHarmless) {
     exerciseEverything(&path, &instance, &broker);
 }
 
-namespace {
-
 CMPIInstance* makeInstanceButFail(const CMPIBroker*, const CMPIObjectPath*, CMPIStatus* status) {
     static CMPIInstance instance{};
     status->rc = CMPI_RC_ERR_FAILED;
@@ -310,8 +302,6 @@ CMPIDateTime* makeDateTimeButFail(const CMPIBroker*, const char*, CMPIStatus* st
     status->rc = CMPI_RC_ERR_INVALID_PARAMETER;
     return &dateTime;
 }
-
-}  // namespace
 
 TEST(MissingParts, AnObjectCreatedWithAFailedStatusIsNull) {
     CMPIBrokerEncFT table{};
@@ -344,3 +334,5 @@ TEST(MissingParts, ADateTimeThatTheBrokerRejectsIsSetToNull) {
     EXPECT_EQ(seen.nulls, 1);
     EXPECT_EQ(seen.type, CMPI_dateTime);
 }
+
+}  // namespace

@@ -66,8 +66,6 @@ std::vector<std::pair<std::string, std::string>> keysOf(Moniker& moniker) {
     return keys;
 }
 
-}  // namespace
-
 TEST_F(ProviderUtilitiesTest, NumberTheClassesOfTheAgent) {
     const std::vector<std::pair<const char*, unsigned short>> ids = {
         {"VELKO_ComputerSystem", 1},
@@ -290,3 +288,5 @@ TEST_F(ProviderUtilitiesTest, ConvertAMonikerToKeysOfAPath) {
     EXPECT_TRUE(moniker.getName(name));
     EXPECT_EQ(name, "Name") << "the selection is unchanged";
 }
+
+}  // namespace

@@ -25,8 +25,6 @@ protected:
     Problems problems;
 };
 
-}  // namespace
-
 TEST_F(TableReaderTest, ReturnsValuesOfTheRightKind) {
     TableReader table = read("text = 'x'\nflag = true\nnumber = 7\n");
     EXPECT_EQ(table.string("text"), "x");
@@ -94,3 +92,5 @@ TEST_F(TableReaderTest, TreatsAnEmptyArrayAsNoTables) {
     EXPECT_THAT(table.tables("tables"), IsEmpty());
     EXPECT_THAT(problems, IsEmpty());
 }
+
+}  // namespace

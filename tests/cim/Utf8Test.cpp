@@ -23,8 +23,6 @@ std::ostream& operator<<(std::ostream& stream, const Case& one) {
 
 class Utf8Decoding : public testing::TestWithParam<Case> {};
 
-}  // namespace
-
 TEST_P(Utf8Decoding, DecodesTheFirstCharacter) {
     const Case& expected = GetParam();
     const Utf8Character character = firstCharacter(expected.text);
@@ -92,3 +90,5 @@ TEST(Utf8, IsMadeOfAnyBytesByReplacementCharacters) {
         EXPECT_EQ(cim::replaceInvalidUtf8(each.bytes), each.replaced);
     }
 }
+
+}  // namespace

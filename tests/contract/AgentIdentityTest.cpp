@@ -17,7 +17,7 @@ using testsupport::named;
 using testsupport::stringOf;
 using testsupport::text;
 
-constexpr const char* className = "VELKO_OstrelAgent";
+constexpr const char* identityClass = "VELKO_OstrelAgent";
 constexpr const char* notThisAgent = "Could not find specified Agent.";
 
 class AgentIdentityTest : public ProviderTest {
@@ -27,7 +27,7 @@ protected:
     static fs::path marker() { return agentEnvironment::installDirectory() / "version.lv1"; }
 
     static ObjectPath path(std::vector<NamedValue> keys) {
-        return testsupport::objectPath(nameSpace, className, std::move(keys));
+        return testsupport::objectPath(nameSpace, identityClass, std::move(keys));
     }
 
     /** Returns the agent's keys with some values replaced. */
@@ -74,16 +74,16 @@ protected:
 };
 
 TEST_F(AgentIdentityTest, ThereIsExactlyOneAgent) {
-    const Outcome names = provider().enumerateInstanceNames(classPath(className));
+    const Outcome names = provider().enumerateInstanceNames(classPath(identityClass));
     EXPECT_THAT(names, isOk(1));
     EXPECT_EQ(names.paths().size(), 1U);
-    const Outcome instances = provider().enumerateInstances(classPath(className));
+    const Outcome instances = provider().enumerateInstances(classPath(identityClass));
     EXPECT_THAT(instances, isOk(1));
     EXPECT_EQ(instances.instances().size(), 1U);
 }
 
 TEST_F(AgentIdentityTest, ItsPathHasFiveKeys) {
-    const auto paths = provider().enumerateInstanceNames(classPath(className)).paths();
+    const auto paths = provider().enumerateInstanceNames(classPath(identityClass)).paths();
     ASSERT_EQ(paths.size(), 1U);
     EXPECT_EQ(testsupport::toText(paths[0]), testsupport::toText(path(keys())));
     EXPECT_EQ(paths[0].nameSpace, nameSpace);
@@ -93,7 +93,7 @@ TEST_F(AgentIdentityTest, ItsPathHasFiveKeys) {
 }
 
 TEST_F(AgentIdentityTest, ItsInstanceHasNineStringsInOrder) {
-    const auto instances = provider().enumerateInstances(classPath(className)).instances();
+    const auto instances = provider().enumerateInstances(classPath(identityClass)).instances();
     ASSERT_EQ(instances.size(), 1U);
     EXPECT_EQ(testsupport::toText(instances[0].path), testsupport::toText(path(keys())));
     EXPECT_THAT(shown(instances[0].properties),
@@ -106,7 +106,7 @@ TEST_F(AgentIdentityTest, ItsInstanceHasNineStringsInOrder) {
 }
 
 TEST_F(AgentIdentityTest, ItIsInTheRequestsNamespace) {
-    const auto paths = provider().enumerateInstanceNames(testsupport::objectPath("root/other", className)).paths();
+    const auto paths = provider().enumerateInstanceNames(testsupport::objectPath("root/other", identityClass)).paths();
     ASSERT_EQ(paths.size(), 1U);
     EXPECT_EQ(paths[0].nameSpace, "root/other");
 }
@@ -114,7 +114,7 @@ TEST_F(AgentIdentityTest, ItIsInTheRequestsNamespace) {
 TEST_F(AgentIdentityTest, ItIsReturnedForAllItsKeys) {
     EXPECT_TRUE(isTheAgent(keys()));
     const auto got = provider().getInstance(path(keys())).instances();
-    const auto enumerated = provider().enumerateInstances(classPath(className)).instances();
+    const auto enumerated = provider().enumerateInstances(classPath(identityClass)).instances();
     ASSERT_EQ(got.size(), 1U);
     EXPECT_EQ(shown(got[0].properties), shown(enumerated.at(0).properties));
 }
@@ -188,7 +188,7 @@ TEST_F(AgentIdentityTest, EnumerationPathsAreComparedToo) {
 
 TEST_F(AgentIdentityTest, BothNamesHaveTheSuffixIfTheMarkerFileExists) {
     testsupport::writeFile(marker(), "");
-    const auto instances = provider().enumerateInstances(classPath(className)).instances();
+    const auto instances = provider().enumerateInstances(classPath(identityClass)).instances();
     ASSERT_EQ(instances.size(), 1U);
     EXPECT_EQ(stringOf(instances[0].properties, "Name"), "Test Agent Tarvik Agent");
     EXPECT_EQ(stringOf(instances[0].properties, "ProductName"), "Test Agent Tarvik Agent");
@@ -208,7 +208,7 @@ TEST_F(AgentIdentityTest, TheMarkerFileIsCheckedInEachRequest) {
 TEST_F(AgentIdentityTest, ThePropertyListIsNotApplied) {
     const std::vector<std::string> one{"Status"};
     EXPECT_EQ(provider().getInstance(path(keys()), one).instances().at(0).properties.size(), 9U);
-    EXPECT_EQ(provider().enumerateInstances(classPath(className), one).instances().at(0).properties.size(), 9U);
+    EXPECT_EQ(provider().enumerateInstances(classPath(identityClass), one).instances().at(0).properties.size(), 9U);
 }
 
 TEST_F(AgentIdentityTest, TheAgentCannotBeCreatedModifiedOrDeleted) {
@@ -222,19 +222,19 @@ TEST_F(AgentIdentityTest, TheAgentCannotBeCreatedModifiedOrDeleted) {
 TEST_F(AgentIdentityTest, ObjectsThatCannotBeCreatedAreSkipped) {
     for (const char* function : {"CMPIBrokerEncFT.newObjectPath", "CMPIBrokerEncFT.newInstance"}) {
         broker.failCall(function, 1, CMPI_RC_ERR_FAILED);
-        const Outcome outcome = provider().enumerateInstances(classPath(className));
+        const Outcome outcome = provider().enumerateInstances(classPath(identityClass));
         EXPECT_THAT(outcome, isOk(1)) << function;
         EXPECT_THAT(outcome.instances(), IsEmpty()) << function;
     }
     broker.answerNothing("CMPIBrokerEncFT.newObjectPath", 1);
-    const Outcome names = provider().enumerateInstanceNames(classPath(className));
+    const Outcome names = provider().enumerateInstanceNames(classPath(identityClass));
     EXPECT_THAT(names, isOk(1));
     EXPECT_THAT(names.paths(), IsEmpty());
     EXPECT_THAT(loggedFailures(), IsEmpty());
 }
 
 TEST_F(AgentIdentityTest, NoOtherProviderIsCalled) {
-    provider().enumerateInstances(classPath(className));
+    provider().enumerateInstances(classPath(identityClass));
     for (const std::string& function : broker.functions()) {
         EXPECT_NE(function.rfind("CMPIBrokerFT.", 0), 0U) << function;
     }

@@ -20,7 +20,7 @@ using testing::Field;
 using testing::IsEmpty;
 
 constexpr const char* providerName = "LeaseAndWarrantyProvider";
-constexpr const char* entryUnit = "LeaseAndWarrantyProvider.cpp";
+constexpr const char* entryPointsFile = "LeaseAndWarrantyProvider.cpp";
 constexpr int errorLevel = 3000;
 
 std::string identifierOf(const std::vector<NamedValue>& values) {
@@ -102,7 +102,7 @@ std::vector<std::string> loggedFailures(const std::string& channel) {
 }
 
 std::vector<std::string> caughtFailures() {
-    return failures("log", [](const LogRecord& record) { return record.file == entryUnit; });
+    return failures("log", [](const LogRecord& record) { return record.file == entryPointsFile; });
 }
 
 testing::Matcher<const Outcome&> isOk(int doneCount) {

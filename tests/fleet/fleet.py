@@ -7,7 +7,7 @@ import sys
 
 sys.path.insert(0, str(pathlib.Path(__file__).resolve().parent.parent / "manual"))
 
-from surroundings import Surroundings
+from environment import Environment
 
 ROOT = pathlib.Path(__file__).resolve().parent.parent.parent
 PROVIDERS = {"gate": "LeaseAndWarrantyGate.reg", "bare": "LeaseAndWarrantyProvider.reg"}
@@ -19,7 +19,7 @@ ASSET = {"AssetNumber": "A-4711", "PrimaryOwnerName": "Jo Example", "PrimaryOwne
          "SystemLocation": "Building 3", "PurchaseDate": "20260115000000.000000+060"}
 
 
-class Fleet(Surroundings):
+class Fleet(Environment):
     """@param provider  "gate" or "bare"; None for the one that cimhost uses by default"""
 
     def __init__(self, build, provider=None):

@@ -18,7 +18,7 @@ using testing::HasSubstr;
 constexpr CMPIrc brokerCode = CMPI_RC_ERR_ACCESS_DENIED;
 
 /** Broker functions that the gate calls, directly or through the provider, except for its error messages. */
-const std::vector<std::string> functions{
+const std::vector<std::string> brokerFunctions{
     "CMPIBrokerEncFT.newObjectPath",    "CMPIBrokerEncFT.newInstance",   "CMPIBrokerEncFT.newDateTimeFromChars",
     "CMPIBrokerFT.enumerateInstances",  "CMPIObjectPathFT.addKey",       "CMPIObjectPathFT.getNameSpace",
     "CMPIObjectPathFT.getClassName",    "CMPIObjectPathFT.getKeyCount",  "CMPIObjectPathFT.getKey",
@@ -123,7 +123,7 @@ class EachOperationTest : public BrokerFailureTest, public testing::WithParamInt
 TEST_P(EachOperationTest, ReturnsNoPartialResultIfAnyCallFails) {
     const Operation operation = operations().at(GetParam());
     const std::vector<std::string> before = state();
-    for (const std::string& function : functions) {
+    for (const std::string& function : brokerFunctions) {
         const int calls = callsOf(function, operation);
         for (int call = 1; call <= calls; ++call) {
             const std::string what = function + " fails at call " + std::to_string(call);
@@ -147,7 +147,7 @@ TEST_P(EachOperationTest, ReturnsNoPartialResultIfAnyCallFails) {
 
 TEST_P(EachOperationTest, SurvivesFunctionsThatReturnNull) {
     const Operation operation = operations().at(GetParam());
-    for (const std::string& function : functions) {
+    for (const std::string& function : brokerFunctions) {
         broker.answerNothingEver(function);
         const Outcome outcome = operation();
         broker.cancelFailures();

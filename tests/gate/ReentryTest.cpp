@@ -14,7 +14,7 @@ namespace gatetest {
 namespace {
 
 constexpr int clients = 8;
-constexpr int rounds = 20 / SHARES;
+constexpr int roundsOfAClient = 20 / SHARES;
 
 /** Aborts the program if it is not destroyed in time, since requests that wait for each other would never end. */
 class Deadline {
@@ -113,7 +113,7 @@ TEST_P(ReentryTest, ProvidersOfUpCallsCanCallTheGateUnderLoad) {
     std::vector<std::thread> threads;
     for (int client = 0; client < clients; ++client) {
         threads.emplace_back([&] {
-            for (int round = 0; round < rounds; ++round) {
+            for (int round = 0; round < roundsOfAClient; ++round) {
                 const Outcome names = gate().associatorNames(computerPath("alpha"), {leaseSetting, {}, {}, {}});
                 const Outcome links = gate().enumerateInstances(classPath(leaseSetting));
                 wrong += identifiersOf(names.paths()) == std::vector<std::string>{firstNode} ? 0 : 1;
@@ -126,7 +126,7 @@ TEST_P(ReentryTest, ProvidersOfUpCallsCanCallTheGateUnderLoad) {
     }
     EXPECT_EQ(wrong, 0);
     EXPECT_EQ(reentering.failures, 0);
-    EXPECT_GE(reentering.reentries, 2 * clients * rounds);
+    EXPECT_GE(reentering.reentries, 2 * clients * roundsOfAClient);
     unload();  // before the other broker is destroyed
 }
 

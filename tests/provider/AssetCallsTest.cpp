@@ -19,7 +19,7 @@ using testing::Not;
 
 using Calls = std::vector<std::string>;
 
-constexpr const char* source = "AssetIDDetails.cpp";
+constexpr const char* assetSource = "AssetIDDetails.cpp";
 constexpr const char* lock = "lock 4294967295";
 constexpr const char* creationFailed = "Failed while opening Asset.dat in write mode";
 constexpr const char* readingFailed = "Throwing Exception in Constructor";
@@ -145,7 +145,7 @@ TEST_F(AssetCalls, ThatFailToReadLeaveNoValuesAndReleaseTheLock) {
             const AssetIDDetails element;
             expectNothingStored(element);
             EXPECT_FALSE(assetFileDouble::locked());
-            EXPECT_THAT(logMessagesOf(source, "AssetIDDetails"), Contains(message(readingFailed, source)));
+            EXPECT_THAT(logMessagesOf(assetSource, "AssetIDDetails"), Contains(message(readingFailed, assetSource)));
         }
     }
 }
@@ -174,7 +174,7 @@ TEST_F(AssetCalls, ThatCannotLockForReadingReadNothing) {
         Calls expected = creation;
         expected.insert(expected.end(), {"PropertyFile asset.dat", lock, "~PropertyFile"});
         EXPECT_THAT(callsOf([] { expectNothingStored(AssetIDDetails()); }), ElementsAreArray(expected));
-        EXPECT_THAT(logMessagesOf(source, "AssetIDDetails"), Contains(message(readingFailed, source)));
+        EXPECT_THAT(logMessagesOf(assetSource, "AssetIDDetails"), Contains(message(readingFailed, assetSource)));
     }
 }
 
@@ -186,9 +186,9 @@ TEST_F(AssetCalls, ThatCannotLockForCreatingTheFileCreateNoFile) {
         const Calls calls = callsOf([] { AssetIDDetails(); });
         EXPECT_EQ(calls.at(0), lock);
         EXPECT_THAT(calls, Not(Contains(testing::StartsWith("File"))));
-        const auto records = recordsOf(source, "getFileName");
+        const auto records = recordsOf(assetSource, "getFileName");
         ASSERT_EQ(records.size(), 3U);
-        EXPECT_EQ(withoutLine(records[1].text), message(creationFailed, source));
+        EXPECT_EQ(withoutLine(records[1].text), message(creationFailed, assetSource));
         EXPECT_EQ(records[1].level, 6000);
         EXPECT_FALSE(assetFileDouble::locked());
     }
@@ -200,12 +200,12 @@ std::vector<bool> loggedWhenUnlocked(const char* function, const char* text, Ope
     std::vector<bool> wasLogged;
     agentEnvironment::forgetLog();
     assetFileDouble::before("unlock", [&] {
-        const auto logMessages = logMessagesOf(source, function);
-        wasLogged.push_back(std::find(logMessages.begin(), logMessages.end(), message(text, source)) !=
+        const auto logMessages = logMessagesOf(assetSource, function);
+        wasLogged.push_back(std::find(logMessages.begin(), logMessages.end(), message(text, assetSource)) !=
                             logMessages.end());
     });
     operation();
-    EXPECT_THAT(logMessagesOf(source, function), Contains(message(text, source)));
+    EXPECT_THAT(logMessagesOf(assetSource, function), Contains(message(text, assetSource)));
     assetFileDouble::before("unlock", [] {});
     return wasLogged;
 }
@@ -231,10 +231,11 @@ TEST_F(AssetCalls, ReadLabelAndDataOfAPairBeforeEitherIsLogged) {
     std::vector<std::size_t> loggedBefore;
     for (const char* number : {"1", "2", "3", "4", "5"}) {
         assetFileDouble::before(std::string("read text USER.PersonalizedData") + number, [&] {
-            const auto logMessages = logMessagesOf(source, "AssetIDDetails");
+            const auto logMessages = logMessagesOf(assetSource, "AssetIDDetails");
             loggedBefore.push_back(static_cast<std::size_t>(
                 std::count_if(logMessages.begin(), logMessages.end(), [](const std::string& text) {
-                    return text == variable("label", "Null", source) || text == variable("data", "Null", source);
+                    return text == variable("label", "Null", assetSource) ||
+                           text == variable("data", "Null", assetSource);
                 })));
         });
     }
@@ -261,9 +262,9 @@ TEST_F(AssetCalls, ThatCannotCreateTheFileStillReadIt) {
             agentEnvironment::forgetLog();
             assetFileDouble::before(call, failure);
             EXPECT_TRUE(loaded(AssetIDDetails()));
-            const auto records = recordsOf(source, "getFileName");
+            const auto records = recordsOf(assetSource, "getFileName");
             ASSERT_EQ(records.size(), 3U);
-            EXPECT_EQ(withoutLine(records[1].text), message(creationFailed, source));
+            EXPECT_EQ(withoutLine(records[1].text), message(creationFailed, assetSource));
             EXPECT_EQ(records[1].level, 6000);
         }
     }
@@ -280,7 +281,7 @@ TEST_F(AssetCalls, ThatFailToWriteAreOnlyLoggedAndReleaseTheLock) {
             agentEnvironment::forgetLog();
             element.flushAssetData();
             EXPECT_FALSE(assetFileDouble::locked());
-            EXPECT_THAT(logMessagesOf(source, "flushAssetData"), Contains(message(writingFailed, source)));
+            EXPECT_THAT(logMessagesOf(assetSource, "flushAssetData"), Contains(message(writingFailed, assetSource)));
         }
     }
 }

@@ -9,16 +9,16 @@ namespace {
 using namespace providerTest;
 using testing::ElementsAre;
 
-constexpr const char* source = "AssetIDDetails.cpp";
+constexpr const char* assetSource = "AssetIDDetails.cpp";
 
 using AssetTrace = AssetFile;
 
 TEST_F(AssetTrace, LogsTheFilePath) {
     const AssetIDDetails element;
-    EXPECT_THAT(logMessagesOf(source, "getFileName"),
-                ElementsAre(entering("getFileName", source),
-                            message("Asset.dat file opened in write mode Successfully", source),
-                            exiting("getFileName", source)));
+    EXPECT_THAT(logMessagesOf(assetSource, "getFileName"),
+                ElementsAre(entering("getFileName", assetSource),
+                            message("Asset.dat file opened in write mode Successfully", assetSource),
+                            exiting("getFileName", assetSource)));
 }
 
 TEST_F(AssetTrace, LogsTheValuesThatItReads) {
@@ -27,19 +27,19 @@ TEST_F(AssetTrace, LogsTheValuesThatItReads) {
           "USER.Department=D\nUSER.Location=L\nUSER.ZOPMProfile=Z\nUSER.PersonalizedLabel2=two\n");
     const AssetIDDetails element;
     std::vector<std::string> expected = {
-        entering("AssetIDDetails", source),          message("Opening File", source),
-        message("File Locked successfully", source), message("File Open successfully", source),
-        variable("_AssetNumber", "A-1", source),     variable("_AssetIdTag", "TAG", source),
-        variable("_OwnerName", "Anna", source),      variable("_OwnerPhone", "1", source),
-        variable("_OwnerPosition", "P", source),     variable("_OwnerDepartment", "D", source),
-        variable("_SystemLocation", "L", source),    variable("_ZOPMProfile", "Z", source),
+        entering("AssetIDDetails", assetSource),          message("Opening File", assetSource),
+        message("File Locked successfully", assetSource), message("File Open successfully", assetSource),
+        variable("_AssetNumber", "A-1", assetSource),     variable("_AssetIdTag", "TAG", assetSource),
+        variable("_OwnerName", "Anna", assetSource),      variable("_OwnerPhone", "1", assetSource),
+        variable("_OwnerPosition", "P", assetSource),     variable("_OwnerDepartment", "D", assetSource),
+        variable("_SystemLocation", "L", assetSource),    variable("_ZOPMProfile", "Z", assetSource),
     };
     for (const char* label : {"Null", "two", "Null", "Null", "Null"}) {
-        expected.push_back(variable("label", label, source));
-        expected.push_back(variable("data", "Null", source));
+        expected.push_back(variable("label", label, assetSource));
+        expected.push_back(variable("data", "Null", assetSource));
     }
-    expected.push_back(exiting("AssetIDDetails", source));
-    EXPECT_EQ(logMessagesOf(source, "AssetIDDetails"), expected);
+    expected.push_back(exiting("AssetIDDetails", assetSource));
+    EXPECT_EQ(logMessagesOf(assetSource, "AssetIDDetails"), expected);
     for (const LogRecord& record : agentEnvironment::log()) {
         EXPECT_EQ(record.level, 4000);
         EXPECT_EQ(record.logger, "Tarvik.LeaseWarrantyProvider");
@@ -51,22 +51,22 @@ TEST_F(AssetTrace, CreatesTheFileBeforeItLogsItsConstruction) {
     const AssetIDDetails element;
     const auto lines = logMessages();
     ASSERT_GT(lines.size(), 4U);
-    EXPECT_EQ(lines[0], entering("getFileName", source));
-    EXPECT_EQ(lines[2], exiting("getFileName", source));
-    EXPECT_EQ(lines[3], entering("AssetIDDetails", source));
+    EXPECT_EQ(lines[0], entering("getFileName", assetSource));
+    EXPECT_EQ(lines[2], exiting("getFileName", assetSource));
+    EXPECT_EQ(lines[3], entering("AssetIDDetails", assetSource));
 }
 
 TEST_F(AssetTrace, LogsFiltersAtErrorLevel) {
     AssetIDDetails element;
     agentEnvironment::forgetLog();
     element.setFilter(AssetIDDetails::FILTER_NAME, "tight");
-    EXPECT_THAT(logMessagesOf(source, "setFilter"),
-                ElementsAre(entering("setFilter", source, " filterType=1 reference=tight"),
-                            exiting("setFilter", source, " filterType=1 reference=tight")));
-    for (const LogRecord& record : recordsOf(source, "setFilter")) {
+    EXPECT_THAT(logMessagesOf(assetSource, "setFilter"),
+                ElementsAre(entering("setFilter", assetSource, " filterType=1 reference=tight"),
+                            exiting("setFilter", assetSource, " filterType=1 reference=tight")));
+    for (const LogRecord& record : recordsOf(assetSource, "setFilter")) {
         EXPECT_EQ(record.level, 3000);
     }
-    for (const LogRecord& record : recordsOf(source, "evaluate")) {
+    for (const LogRecord& record : recordsOf(assetSource, "evaluate")) {
         EXPECT_EQ(record.level, 4000);
     }
 }
@@ -88,8 +88,8 @@ TEST_F(AssetTrace, LogsEntryAndExitOfItsOperations) {
     for (const char* function :
          {"operator bool", "operator++", "getAssetNumber", "getDeploymentUpdateTime", "setSystemPurchaseDate",
           "setOwnerPhone", "setPersonalizedData", "flushAssetData", "getAssetIDStringArea"}) {
-        expected.push_back(entering(function, source));
-        expected.push_back(exiting(function, source));
+        expected.push_back(entering(function, assetSource));
+        expected.push_back(exiting(function, assetSource));
     }
     EXPECT_EQ(logMessages(), expected);
 }

@@ -10,8 +10,6 @@ using namespace providerTest;
 using testing::ElementsAre;
 using testing::IsEmpty;
 
-constexpr const char* entryFile = "LeaseAndWarrantyProvider.cpp";
-
 /** A record class, its count, and the exception message for a wrong count. */
 struct CountedStore {
     const char* className;

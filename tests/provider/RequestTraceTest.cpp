@@ -11,9 +11,6 @@ using namespace providerTest;
 using testing::Contains;
 using testing::ElementsAre;
 
-constexpr const char* entryFile = "LeaseAndWarrantyProvider.cpp";
-const std::string rule(78, '=');
-
 using RequestTrace = RequestTest;
 
 TEST_F(RequestTrace, IsEnclosedBySeparators) {

@@ -16,6 +16,10 @@ namespace providerTest {
 
 using agentEnvironment::LogRecord;
 
+/** The file of the entry points in the log, and the line before and after each request. */
+constexpr const char* entryFile = "LeaseAndWarrantyProvider.cpp";
+inline const std::string rule(78, '=');
+
 inline std::string contentOf(const std::filesystem::path& file) {
     std::ifstream stream(file, std::ios::binary);
     return {std::istreambuf_iterator<char>(stream), {}};

@@ -39,16 +39,16 @@ TEST_P(TraceKind, HasItsFormatWithTheParameterListLast) {
     EXPECT_STREQ(tracepara("createLease", "LeaseBase.cpp", 240, " instanceId=A", kind), GetParam().withList);
 }
 
-const KindRow entering{0, "ENTERING: createLease() in LeaseBase.cpp [Line: 240]",
-                       "ENTERING: createLease() in LeaseBase.cpp [Line: 240],Parameters List:  instanceId=A"};
+const KindRow enteringRow{0, "ENTERING: createLease() in LeaseBase.cpp [Line: 240]",
+                          "ENTERING: createLease() in LeaseBase.cpp [Line: 240],Parameters List:  instanceId=A"};
 
 KindRow countingAsEntering(int kind) {
-    return {kind, entering.plain, entering.withList};
+    return {kind, enteringRow.plain, enteringRow.withList};
 }
 
 INSTANTIATE_TEST_SUITE_P(
     Listed, TraceKind,
-    testing::Values(entering,
+    testing::Values(enteringRow,
                     KindRow{1, "EXITING: createLease() in LeaseBase.cpp [Line: 240]",
                             "EXITING: createLease() in LeaseBase.cpp [Line: 240],Parameters List:  instanceId=A"},
                     KindRow{2, "METHOD: createLease() was invoked in LeaseBase.cpp [Line: 240]",

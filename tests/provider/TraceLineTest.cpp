@@ -200,8 +200,6 @@ void expectMarkers(const std::vector<Marker>& expected) {
     }
 }
 
-const std::string rule(78, '=');
-
 TEST_F(TraceLine, StartsARequestWithASeparatorAndTheEnteringLine) {
     markProviderEntry(loggerOfTest, "LeaseAndWarranty_GetInstance", "Entry.cpp", 41);
     const std::string line = "ENTERING: LeaseAndWarranty_GetInstance() in Entry.cpp [Line: 41]";

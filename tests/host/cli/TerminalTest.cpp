@@ -12,7 +12,7 @@ using testing::HasSubstr;
 using testing::Le;
 using testing::Not;
 
-constexpr unsigned short wide = 200;
+constexpr unsigned short wideTerminal = 200;
 constexpr auto escape = "\033[";
 
 std::vector<std::size_t> widthsOf(const std::string& text) {
@@ -32,32 +32,33 @@ std::string squeezed(std::string text) {
 }
 
 TEST(Colours, AreForTerminalsOnly) {
-    EXPECT_THAT(runOnTerminal({"ei", "Test_Box"}, wide).output, HasSubstr(escape));
-    EXPECT_THAT(runOnTerminal({"classes"}, wide).output, HasSubstr(escape));
-    EXPECT_THAT(runOnTerminal({"gi", "Test_Box.Name=\"none\""}, wide).output, HasSubstr(escape));
+    EXPECT_THAT(runOnTerminal({"ei", "Test_Box"}, wideTerminal).output, HasSubstr(escape));
+    EXPECT_THAT(runOnTerminal({"classes"}, wideTerminal).output, HasSubstr(escape));
+    EXPECT_THAT(runOnTerminal({"gi", "Test_Box.Name=\"none\""}, wideTerminal).output, HasSubstr(escape));
     EXPECT_THAT(run({"ei", "Test_Box"}).output, Not(HasSubstr(escape)));
     EXPECT_THAT(run({"gi", "Test_Box.Name=\"none\""}).error, Not(HasSubstr(escape)));
 }
 
 TEST(Colours, AreOmittedIfTheyAreNotWanted) {
     for (const char* variable : {"NO_COLOR=1", "TERM=dumb"}) {
-        const Ended shown = runOnTerminal({"ei", "Test_Box"}, wide, {variable});
+        const Ended shown = runOnTerminal({"ei", "Test_Box"}, wideTerminal, {variable});
         EXPECT_EQ(shown.output, run({"ei", "Test_Box"}).output) << variable;
     }
-    EXPECT_THAT(runOnTerminal({"--color", "never", "ei", "Test_Box"}, wide).output, Not(HasSubstr(escape)));
-    EXPECT_THAT(runOnTerminal({"--color", "never", "gi", "Test_Box.Name=\"none\""}, wide).output,
+    EXPECT_THAT(runOnTerminal({"--color", "never", "ei", "Test_Box"}, wideTerminal).output, Not(HasSubstr(escape)));
+    EXPECT_THAT(runOnTerminal({"--color", "never", "gi", "Test_Box.Name=\"none\""}, wideTerminal).output,
                 Not(HasSubstr(escape)));
 }
 
 TEST(Colours, AreUsedIfTheyAreRequested) {
     EXPECT_THAT(run({"--color", "always", "ei", "Test_Box"}).output, HasSubstr(escape));
     EXPECT_THAT(run({"--color", "always", "gi", "Test_Box.Name=\"none\""}).error, HasSubstr(escape));
-    EXPECT_THAT(runOnTerminal({"--color", "always", "ei", "Test_Box"}, wide, {"NO_COLOR=1"}).output, HasSubstr(escape));
+    EXPECT_THAT(runOnTerminal({"--color", "always", "ei", "Test_Box"}, wideTerminal, {"NO_COLOR=1"}).output,
+                HasSubstr(escape));
 }
 
 TEST(Colours, AreNotForPrograms) {
     for (const char* format : {"json", "mof"}) {
-        const Ended shown = runOnTerminal({"--color", "always", "--format", format, "ei", "Test_Box"}, wide);
+        const Ended shown = runOnTerminal({"--color", "always", "--format", format, "ei", "Test_Box"}, wideTerminal);
         EXPECT_EQ(shown.output, run({"--format", format, "ei", "Test_Box"}).output);
     }
 }
@@ -95,7 +96,7 @@ TEST(Window, PutsEachCellOnALineIfItIsTooNarrow) {
 }
 
 TEST(Window, CanBeSetByAVariable) {
-    EXPECT_EQ(runOnTerminal({"ei", "Test_Box"}, wide, {"COLUMNS=40"}).output,
+    EXPECT_EQ(runOnTerminal({"ei", "Test_Box"}, wideTerminal, {"COLUMNS=40"}).output,
               runOnTerminal({"ei", "Test_Box"}, 40).output);
     EXPECT_EQ(runOnTerminal({"ei", "Test_Box"}, 40, {"COLUMNS=some"}).output,
               runOnTerminal({"ei", "Test_Box"}, 40).output);

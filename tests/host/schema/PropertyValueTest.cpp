@@ -9,7 +9,7 @@ namespace {
 using testing::HasSubstr;
 using testing::StartsWith;
 
-const Schema& schema() {
+const Schema& everySchema() {
     static const Schema known = schemaOf(R"(
         class Disk { [Key] string ID; };
         class Every {
@@ -20,7 +20,8 @@ const Schema& schema() {
 }
 
 Value parse(const std::string& property, const std::string& text) {
-    return parsePropertyValue(text, *schema().findClass("Every")->findProperty(property), schema(), "root/cimv2");
+    return parsePropertyValue(text, *everySchema().findClass("Every")->findProperty(property), everySchema(),
+                              "root/cimv2");
 }
 
 std::string refusal(const std::string& property, const std::string& text) {

@@ -18,7 +18,7 @@ std::vector<ProviderRegistration> read(const std::string& text) {
     return readRegistrations(stream, "test.reg");
 }
 
-std::string refusal(const std::string& text) {
+std::string messageOf(const std::string& text) {
     try {
         read(text);
         return "";
@@ -82,20 +82,21 @@ TEST(Registration, AnEmptyFileRegistersNothing) {
 }
 
 TEST(RegistrationError, NamesFileAndLine) {
-    EXPECT_THAT(refusal("#\nprovider: P\n"), StartsWith("test.reg:2: expected [CLASS] before"));
-    EXPECT_THAT(refusal("[One]\nprovider P\n"), StartsWith("test.reg:2: expected [CLASS], \"keyword: value\""));
-    EXPECT_THAT(refusal("[One\n"), StartsWith("test.reg:1: expected ]"));
-    EXPECT_THAT(refusal("[]\n"), StartsWith("test.reg:1: expected a class name"));
-    EXPECT_THAT(refusal("[a b]\n"), StartsWith("test.reg:1: expected a class name"));
-    EXPECT_THAT(refusal("[One]\nprovider:\n"), StartsWith("test.reg:2: expected one word after \"provider:\""));
-    EXPECT_THAT(refusal("[One]\nlocation: a b\n"), StartsWith("test.reg:2: expected one word"));
+    EXPECT_THAT(messageOf("#\nprovider: P\n"), StartsWith("test.reg:2: expected [CLASS] before"));
+    EXPECT_THAT(messageOf("[One]\nprovider P\n"), StartsWith("test.reg:2: expected [CLASS], \"keyword: value\""));
+    EXPECT_THAT(messageOf("[One\n"), StartsWith("test.reg:1: expected ]"));
+    EXPECT_THAT(messageOf("[]\n"), StartsWith("test.reg:1: expected a class name"));
+    EXPECT_THAT(messageOf("[a b]\n"), StartsWith("test.reg:1: expected a class name"));
+    EXPECT_THAT(messageOf("[One]\nprovider:\n"), StartsWith("test.reg:2: expected one word after \"provider:\""));
+    EXPECT_THAT(messageOf("[One]\nlocation: a b\n"), StartsWith("test.reg:2: expected one word"));
 }
 
 TEST(RegistrationError, AStanzaMustSayWhichProviderInWhichLibraryServesWhichNamespace) {
-    EXPECT_THAT(refusal("[One]\nlocation: L\nnamespace: n\n"), StartsWith("test.reg:1: the section [One] has no line"));
-    EXPECT_THAT(refusal("[One]\nlocation: L\nnamespace: n\n"), HasSubstr("provider: NAME"));
-    EXPECT_THAT(refusal("[One]\nprovider: P\nnamespace: n\n[Two]"), HasSubstr("location: LIBRARY"));
-    EXPECT_THAT(refusal("[One]\nprovider: P\nlocation: L\n"), HasSubstr("namespace: root/cimv2"));
+    EXPECT_THAT(messageOf("[One]\nlocation: L\nnamespace: n\n"),
+                StartsWith("test.reg:1: the section [One] has no line"));
+    EXPECT_THAT(messageOf("[One]\nlocation: L\nnamespace: n\n"), HasSubstr("provider: NAME"));
+    EXPECT_THAT(messageOf("[One]\nprovider: P\nnamespace: n\n[Two]"), HasSubstr("location: LIBRARY"));
+    EXPECT_THAT(messageOf("[One]\nprovider: P\nlocation: L\n"), HasSubstr("namespace: root/cimv2"));
 }
 
 TEST(RegistrationFile, IsReadWithThePositionOfEachSection) {

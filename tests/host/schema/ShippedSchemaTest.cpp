@@ -11,7 +11,7 @@ namespace {
 using testing::ElementsAre;
 using testing::UnorderedElementsAreArray;
 
-const std::filesystem::path directory = SCHEMA_DIRECTORY;
+const std::filesystem::path schemaDirectory = SCHEMA_DIRECTORY;
 
 /** Each property as "name type", with * for keys and + for properties that clients may modify. */
 std::vector<std::string> shape(const Class& known) {
@@ -28,7 +28,7 @@ std::vector<std::string> shape(const Class& known) {
 
 Schema shipped() {
     Schema schema;
-    MofReader(schema).readFile(directory / "velko.mof");
+    MofReader(schema).readFile(schemaDirectory / "velko.mof");
     return schema;
 }
 
@@ -63,8 +63,8 @@ TEST(ShippedSchema, EachClassFileIsCompleteWithTheQualifiers) {
     for (const std::string& name : classNames) {
         Schema schema;
         MofReader reader(schema);
-        reader.readFile(directory / "velko-qualifiers.mof");
-        reader.readFile(directory / (name + ".mof"));
+        reader.readFile(schemaDirectory / "velko-qualifiers.mof");
+        reader.readFile(schemaDirectory / (name + ".mof"));
         ASSERT_EQ(schema.classes().size(), 1U) << name;
         EXPECT_EQ(schema.classes()[0]->name, name);
         EXPECT_EQ(schema.classes()[0]->superclass, "") << name;
@@ -110,7 +110,7 @@ TEST(ShippedSchema, SettingsAreAssociationsAndTheirReferencesBearNoRead) {
 
 TEST(ShippedSchema, TheFilesLoadInTheOrderOfTheirNamesToo) {
     std::vector<std::filesystem::path> files;
-    for (const auto& entry : std::filesystem::directory_iterator(directory)) {
+    for (const auto& entry : std::filesystem::directory_iterator(schemaDirectory)) {
         if (entry.path().extension() == ".mof") {
             files.push_back(entry.path());
         }
