@@ -14,11 +14,11 @@ const NamedValue* findNamed(const std::vector<NamedValue>& values, std::string_v
     return found == values.end() ? nullptr : &*found;
 }
 
-void setNamed(std::vector<NamedValue>& values, std::string_view name, Value value) {
+void setNamed(std::vector<NamedValue>& values, std::string name, Value value) {
     const auto found = std::find_if(values.begin(), values.end(),
                                     [&](const NamedValue& each) { return cim::sameName(each.name, name); });
     if (found == values.end()) {
-        values.push_back({std::string(name), std::move(value)});
+        values.push_back({std::move(name), std::move(value)});
     } else {
         found->value = std::move(value);
     }

@@ -146,14 +146,13 @@ OperationResult Operations::enumerateQualifiers(const Call& call) {
                   });
 }
 
-OperationResult Operations::associatedClasses(const Call& call, Operation operation, const ObjectPath& path) const {
+OperationResult Operations::traverseClasses(const Call& call, const ObjectPath& path) const {
     const std::string name = classOf(call, path.className).name;
-    const AssociationFilter filter{call.arguments.className("AssocClass"), call.arguments.className("ResultClass"),
-                                   call.arguments.string("Role"), call.arguments.string("ResultRole")};
+    const AssociationFilter filter = call.arguments.filter();
     const ClassTraversal traversal(call.schema, name, filter);
     Classes found =
-        isReferenceOperation(operation) ? traversal.associations(filter.resultClass) : traversal.associated();
-    if (returnsPaths(operation)) {
+        isReferenceOperation(call.operation) ? traversal.associations(filter.resultClass) : traversal.associated();
+    if (returnsPaths(call.operation)) {
         return listed(std::move(found), [writer = writerFor(call)](std::string& xml, const Class* each) {
             const Element object(xml, "OBJECTPATH");
             writer.appendClassPath(xml, each->name);

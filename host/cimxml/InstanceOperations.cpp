@@ -9,10 +9,6 @@
 namespace cimhost::cimxml {
 namespace {
 
-bool isClassPath(const XmlElement& element) {
-    return element.name == "CLASSNAME";
-}
-
 /** An object path must be that of an instance: each key has a value. */
 void requireKeys(const ObjectPath& path, const Schema& schema) {
     const Class* known = schema.findClass(path.className);
@@ -73,22 +69,23 @@ Response Operations::enumerate(const Call& call, Request request) const {
     return all;
 }
 
-Response Operations::performEnumeration(const Call& call, Operation operation) const {
+ResultCursor Operations::enumeration(const Call& call) const {
     Request request;
-    request.operation = operation;
+    request.operation = call.operation;
     request.path.nameSpace = call.arguments.nameSpace();
     request.path.className = call.arguments.requiredClassName("ClassName");
-    request.properties = call.arguments.strings("PropertyList");
-    return enumerate(call, std::move(request));
+    InstanceParts parts = partsOf(call);
+    request.properties = parts.properties;
+    if (!call.arguments.flag("DeepInheritance", true)) {
+        parts.onlyOf = call.schema.findClass(request.path.className);
+    }
+    return {enumerate(call, std::move(request)), call.form, std::move(parts)};
 }
 
-InstanceParts Operations::partsOf(const Call& call, bool ofClassOnly) const {
+InstanceParts Operations::partsOf(const Call& call) const {
     InstanceParts parts;
     parts.properties = call.arguments.strings("PropertyList");
     parts.origins = call.arguments.flag("IncludeClassOrigin", false) ? &call.schema : nullptr;
-    if (ofClassOnly) {
-        parts.onlyOf = call.schema.findClass(call.arguments.requiredClassName("ClassName"));
-    }
     return parts;
 }
 
@@ -107,16 +104,11 @@ OperationResult Operations::streamed(const Call& call, ResultCursor cursor) cons
 }
 
 OperationResult Operations::enumerateInstances(const Call& call) {
-    const InstanceParts parts = partsOf(call, !call.arguments.flag("DeepInheritance", true));
-    return streamed(call, {performEnumeration(call, Operation::enumerateInstances), ObjectForm::namedInstance, parts});
-}
-
-OperationResult Operations::enumerateInstanceNames(const Call& call) {
-    return streamed(call, {performEnumeration(call, Operation::enumerateInstanceNames), ObjectForm::instanceName});
+    return streamed(call, enumeration(call));
 }
 
 OperationResult Operations::getInstance(const Call& call) {
-    const InstanceParts parts = partsOf(call, false);
+    const InstanceParts parts = partsOf(call);
     const ObjectPath path = call.arguments.path("InstanceName");
     requireKeys(path, call.schema);
     return streamed(call, {send(call, Request::getInstance(path, parts.properties)), ObjectForm::instance, parts});
@@ -158,42 +150,21 @@ Response Operations::associate(const Call& call, Request request) const {
     return hasProvider ? send(call, std::move(request)) : Response{};
 }
 
-Response Operations::performAssociation(const Call& call, Operation operation, const ObjectPath& path) const {
+ResultCursor Operations::traversal(const Call& call, const ObjectPath& path) const {
     requireKeys(path, call.schema);
-    Request request;
-    request.operation = operation;
-    request.path = path;
-    request.filter.associationClass = call.arguments.className("AssocClass");
-    request.filter.resultClass = call.arguments.className("ResultClass");
-    request.filter.role = call.arguments.string("Role");
-    request.filter.resultRole = call.arguments.string("ResultRole");
-    request.properties = call.arguments.strings("PropertyList");
     classOf(call, path.className);
-    return associate(call, std::move(request));
+    Request request;
+    request.operation = call.operation;
+    request.path = path;
+    request.filter = call.arguments.filter();
+    request.properties = call.arguments.strings("PropertyList");
+    return {associate(call, std::move(request)), call.form, partsOf(call)};
 }
 
-OperationResult Operations::association(const Call& call, Operation operation, ObjectForm form) {
+OperationResult Operations::traverse(const Call& call) {
     const ObjectPath path = call.arguments.path("ObjectName");
-    if (isClassPath(call.arguments.required("ObjectName"))) {
-        return associatedClasses(call, operation, path);
-    }
-    return streamed(call, {performAssociation(call, operation, path), form, partsOf(call, false)});
-}
-
-OperationResult Operations::associators(const Call& call) {
-    return association(call, Operation::associators, ObjectForm::objectWithPath);
-}
-
-OperationResult Operations::associatorNames(const Call& call) {
-    return association(call, Operation::associatorNames, ObjectForm::objectPath);
-}
-
-OperationResult Operations::references(const Call& call) {
-    return association(call, Operation::references, ObjectForm::objectWithPath);
-}
-
-OperationResult Operations::referenceNames(const Call& call) {
-    return association(call, Operation::referenceNames, ObjectForm::objectPath);
+    const bool isClass = call.arguments.required("ObjectName").name == "CLASSNAME";
+    return isClass ? traverseClasses(call, path) : streamed(call, traversal(call, path));
 }
 
 }  // namespace cimhost::cimxml

@@ -101,6 +101,10 @@ std::string OperationArguments::requiredString(std::string_view name) const {
     return *string(name);
 }
 
+AssociationFilter OperationArguments::filter() const {
+    return {className("AssocClass"), className("ResultClass"), string("Role"), string("ResultRole")};
+}
+
 const XmlElement& OperationArguments::required(std::string_view name) const {
     const XmlElement* element = message.find(name);
     if (element == nullptr) {

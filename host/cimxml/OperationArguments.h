@@ -33,6 +33,7 @@ public:
     std::string requiredClassName(std::string_view name) const;
     std::string requiredString(std::string_view name) const;
     const XmlElement& required(std::string_view name) const;
+    AssociationFilter filter() const;
     ObjectPath path(std::string_view name) const { return elements.path(required(name)); }
 
 private:

@@ -67,13 +67,17 @@ private:
         const Schema& schema;
         UpCalls& target;
         bool isInterop;
+        Operation operation;
+        ObjectForm form;
     };
     using Handler = OperationResult (Operations::*)(const Call&);
     struct Row {
         const char* name;
         bool writes;
         Handler handler;  ///< null: not supported
-        const char* parameters;
+        const char* parameters = nullptr;
+        Operation operation = Operation::enumerateInstances;  ///< of providers
+        ObjectForm form = ObjectForm::instance;               ///< of the results
     };
     static const Row rows[];
 
@@ -83,15 +87,11 @@ private:
     /** @name Operations on instances: InstanceOperations.cpp */
     ///@{
     OperationResult enumerateInstances(const Call& call);
-    OperationResult enumerateInstanceNames(const Call& call);
     OperationResult getInstance(const Call& call);
     OperationResult createInstance(const Call& call);
     OperationResult modifyInstance(const Call& call);
     OperationResult deleteInstance(const Call& call);
-    OperationResult associators(const Call& call);
-    OperationResult associatorNames(const Call& call);
-    OperationResult references(const Call& call);
-    OperationResult referenceNames(const Call& call);
+    OperationResult traverse(const Call& call);
     ///@}
 
     /** @name Operations on classes: ClassOperations.cpp */
@@ -101,22 +101,16 @@ private:
     OperationResult enumerateClassNames(const Call& call);
     OperationResult getQualifier(const Call& call);
     OperationResult enumerateQualifiers(const Call& call);
-    OperationResult associatedClasses(const Call& call, Operation operation, const ObjectPath& path) const;
+    OperationResult traverseClasses(const Call& call, const ObjectPath& path) const;
     ///@}
 
     /** @name Pull operations: PullOperations.cpp */
     ///@{
-    OperationResult openEnumerateInstances(const Call& call);
-    OperationResult openEnumerateInstancePaths(const Call& call);
-    OperationResult openAssociatorInstances(const Call& call);
-    OperationResult openAssociatorInstancePaths(const Call& call);
-    OperationResult openReferenceInstances(const Call& call);
-    OperationResult openReferenceInstancePaths(const Call& call);
-    OperationResult pullInstancesWithPath(const Call& call);
-    OperationResult pullInstancePaths(const Call& call);
+    OperationResult openEnumeration(const Call& call);
+    OperationResult openTraversal(const Call& call);
+    OperationResult pull(const Call& call);
     OperationResult closeEnumeration(const Call& call);
     OperationResult open(const Call& call, ResultCursor cursor);
-    OperationResult pull(const Call& call, bool paths);
     OperationResult part(const Call& call, OpenEnumeration enumeration, const std::string& identifier,
                          std::uint32_t most);
     ///@}
@@ -124,10 +118,9 @@ private:
     Response send(const Call& call, Request request) const;
     Response enumerate(const Call& call, Request request) const;
     Response associate(const Call& call, Request request) const;
-    Response performEnumeration(const Call& call, Operation operation) const;
-    Response performAssociation(const Call& call, Operation operation, const ObjectPath& path) const;
-    InstanceParts partsOf(const Call& call, bool ofClassOnly) const;
-    OperationResult association(const Call& call, Operation operation, ObjectForm form);
+    ResultCursor enumeration(const Call& call) const;
+    ResultCursor traversal(const Call& call, const ObjectPath& path) const;
+    InstanceParts partsOf(const Call& call) const;
 
     /** A result of which elements are written one by one. */
     OperationResult streamed(const Call& call, ResultCursor cursor) const;

@@ -80,7 +80,7 @@ OperationResult Operations::part(const Call& call, OpenEnumeration enumeration, 
     return result;
 }
 
-OperationResult Operations::pull(const Call& call, bool paths) {
+OperationResult Operations::pull(const Call& call) {
     const std::string identifier = call.arguments.requiredString("EnumerationContext");
     const auto most = call.arguments.number("MaxObjectCount");
     if (!most) {
@@ -92,19 +92,11 @@ OperationResult Operations::pull(const Call& call, bool paths) {
     if (!found) {
         throw unknownContext();
     }
-    if (found->cursor.holdsPaths() != paths) {
+    if (found->cursor.form != call.form) {
         enumerations.keep(std::move(*found), identifier, now);
         throw CimError(invalidEnumerationContext, "This enumeration has results of the other kind.");
     }
     return part(call, std::move(*found), identifier, *most);
-}
-
-OperationResult Operations::pullInstancesWithPath(const Call& call) {
-    return pull(call, false);
-}
-
-OperationResult Operations::pullInstancePaths(const Call& call) {
-    return pull(call, true);
 }
 
 OperationResult Operations::closeEnumeration(const Call& call) {
@@ -115,39 +107,14 @@ OperationResult Operations::closeEnumeration(const Call& call) {
     return {};
 }
 
-OperationResult Operations::openEnumerateInstances(const Call& call) {
+OperationResult Operations::openEnumeration(const Call& call) {
     refuseUnsupported(call.arguments);
-    const InstanceParts parts = partsOf(call, !call.arguments.flag("DeepInheritance", true));
-    return open(call, {performEnumeration(call, Operation::enumerateInstances), ObjectForm::instanceWithPath, parts});
+    return open(call, enumeration(call));
 }
 
-OperationResult Operations::openEnumerateInstancePaths(const Call& call) {
+OperationResult Operations::openTraversal(const Call& call) {
     refuseUnsupported(call.arguments);
-    return open(call, {performEnumeration(call, Operation::enumerateInstanceNames), ObjectForm::instancePath});
-}
-
-OperationResult Operations::openAssociatorInstances(const Call& call) {
-    refuseUnsupported(call.arguments);
-    return open(call, {performAssociation(call, Operation::associators, call.arguments.path("InstanceName")),
-                       ObjectForm::instanceWithPath, partsOf(call, false)});
-}
-
-OperationResult Operations::openAssociatorInstancePaths(const Call& call) {
-    refuseUnsupported(call.arguments);
-    return open(call, {performAssociation(call, Operation::associatorNames, call.arguments.path("InstanceName")),
-                       ObjectForm::instancePath});
-}
-
-OperationResult Operations::openReferenceInstances(const Call& call) {
-    refuseUnsupported(call.arguments);
-    return open(call, {performAssociation(call, Operation::references, call.arguments.path("InstanceName")),
-                       ObjectForm::instanceWithPath, partsOf(call, false)});
-}
-
-OperationResult Operations::openReferenceInstancePaths(const Call& call) {
-    refuseUnsupported(call.arguments);
-    return open(call, {performAssociation(call, Operation::referenceNames, call.arguments.path("InstanceName")),
-                       ObjectForm::instancePath});
+    return open(call, traversal(call, call.arguments.path("InstanceName")));
 }
 
 }  // namespace cimhost::cimxml

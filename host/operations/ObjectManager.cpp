@@ -148,7 +148,9 @@ Response ObjectManager::performForInstance(Request request) {
     if (!refusal.ok()) {
         return Response::failed(refusal);
     }
-    return mapResponses(behaviour, request, {call<CMPIInstanceMI>(*served, request)}, keepsEvents);
+    std::vector<ProviderResponse> responses;  // An initializer list would copy the response.
+    responses.push_back(call<CMPIInstanceMI>(*served, request));
+    return mapResponses(behaviour, request, std::move(responses), keepsEvents);
 }
 
 Response ObjectManager::performForAssociation(Request request) {
