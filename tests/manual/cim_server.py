@@ -27,6 +27,25 @@ def class_parameter(name):
     return f'<IPARAMVALUE NAME="ClassName"><CLASSNAME NAME="{name}"/></IPARAMVALUE>'
 
 
+def name_of(class_name, identifier):
+    return (f'<INSTANCENAME CLASSNAME="{class_name}"><KEYBINDING NAME="InstanceID"><KEYVALUE VALUETYPE="string">'
+            f'{identifier}</KEYVALUE></KEYBINDING></INSTANCENAME>')
+
+
+def path_parameter(parameter, class_name, identifier):
+    return f'<IPARAMVALUE NAME="{parameter}">{name_of(class_name, identifier)}</IPARAMVALUE>'
+
+
+def lease_parameter(parameter, identifier, **strings):
+    """Returns a new lease, or a modified one, with properties that are strings."""
+    properties = "".join(f'<PROPERTY NAME="{name}" TYPE="string"><VALUE>{value}</VALUE></PROPERTY>'
+                         for name, value in {"InstanceID": identifier, **strings}.items())
+    lease = f'<INSTANCE CLASSNAME="VELKO_Lease">{properties}</INSTANCE>'
+    if parameter == "ModifiedInstance":
+        lease = f'<VALUE.NAMEDINSTANCE>{name_of("VELKO_Lease", identifier)}{lease}</VALUE.NAMEDINSTANCE>'
+    return f'<IPARAMVALUE NAME="{parameter}">{lease}</IPARAMVALUE>'
+
+
 def headers_for(operation, namespace="root/cimv2", **changed):
     """Returns the headers of a request; a header that is None is left out."""
     headers = {**HEADERS, "CIMMethod": operation, "CIMObject": urllib.parse.quote(namespace, safe=""),
@@ -67,9 +86,9 @@ class CimServer:
         raise AssertionError(f"{self.command} ended with {self.process.wait()}: {self.log.read_text()}")
 
     def __exit__(self, *_):
-        if self.process.poll() is None:
-            self.stop()
+        status = self.stop() if self.process.poll() is None else self.process.returncode
         self.process.stdout.close()
+        assert status == 0, f"the server ended with {status}: {self.log.read_text()}"
 
     def stop(self):
         """Returns the exit status."""
