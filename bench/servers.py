@@ -61,11 +61,13 @@ class Server:
         return re.findall(r"<KEYVALUE[^>]*>([^<]*)<", self.ask("EnumerateInstanceNames", CLASS).decode())
 
     def delete_created(self):
-        """Returns the number of deleted leases."""
-        created = [each for each in self.leases() if each.startswith(CREATED)]
-        for each in created:
-            self.ask("DeleteInstance", path_of(each))
-        return len(created)
+        """Returns the number of deleted leases, also of those that requests without a client still created."""
+        deleted = 0
+        while created := [each for each in self.leases() if each.startswith(CREATED)]:
+            for each in created:
+                self.ask("DeleteInstance", path_of(each))
+            deleted += len(created)
+        return deleted
 
     def measure(self, operation, parameters, connections, seconds):
         with tempfile.NamedTemporaryFile("w", suffix=".xml") as body:
@@ -107,6 +109,8 @@ def measure_creation(server, connections, seconds):
 
 
 def rows(servers, options):
+    for server in servers:
+        server.delete_created()
     leases = servers[0].leases()
     if any(sorted(server.leases()) != sorted(leases) for server in servers):
         sys.exit("the servers have different leases")

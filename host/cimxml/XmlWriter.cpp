@@ -6,6 +6,9 @@ namespace cimhost::cimxml {
 namespace {
 
 const char* entityOf(char character) {
+    if (character > '>') {  // letters, which nearly all characters are
+        return nullptr;
+    }
     switch (character) {
         case '&':
             return "&amp;";

@@ -44,6 +44,7 @@ Status collect(std::vector<ProviderResponse>& responses, Operation operation, bo
             return {CMPI_RC_ERR_FAILED, std::string("The provider returned something other than an ") + kindName<Kind> +
                                             " for " + nameOf(operation) + "."};
         }
+        results.reserve(results.size() + response.events.size());
         for (ResultEvent& event : response.events) {
             if (Kind* one = std::get_if<Kind>(&event)) {
                 results.push_back(keepsEvents ? Kind(*one) : std::move(*one));
