@@ -104,6 +104,12 @@ protected:
     template <class Value>
     void set(const CallSite& site, Property property, const Value& value);
 
+    /**
+     * Moves to the first record that passes all filters, starting at the current one. Each record on the way is traced;
+     * if no such trace would be written, uses the index of identifiers.
+     */
+    void skipToPassing();
+
     bool filterSet = false;
     std::vector<Filter> filters{};
     typename Traits::Base base{};

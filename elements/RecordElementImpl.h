@@ -29,9 +29,10 @@ RecordElement<Traits>::operator bool() {
 template <class Traits>
 void RecordElement<Traits>::operator++() {
     const Traced traced(at(Traits::traceSource));
-    do {
-        ++base;
-    } while (filterSet && base && !evaluate());
+    ++base;
+    if (filterSet) {
+        skipToPassing();
+    }
 }
 
 template <class Traits>
@@ -39,7 +40,20 @@ void RecordElement<Traits>::setFilter(FilterType type, std::string reference) {
     const Traced traced(at(Traits::traceSource), label::filterType, type, label::reference, reference);
     filterSet = true;
     filters.push_back({type, reference});
-    while (base && !evaluate()) {
+    skipToPassing();
+}
+
+template <class Traits>
+void RecordElement<Traits>::skipToPassing() {
+    const auto comparesIdentifier = [](const Filter& filter) { return filter.type == InstanceIDFilter; };
+    const auto filter = std::find_if(filters.begin(), filters.end(), comparesIdentifier);
+    const bool isTraced = isWanted(at(Traits::traceSource)) || base.isTraced();
+    const auto skip = [&] {
+        if (!isTraced && filter != filters.end()) {
+            base.skipTo(filter->reference);
+        }
+    };
+    for (skip(); base && !evaluate(); skip()) {
         ++base;
     }
 }

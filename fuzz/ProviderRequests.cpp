@@ -2,9 +2,11 @@
 #include "Target.h"
 
 #include "LeaseAndWarrantyProvider.h"
+#include "Trace.h"
 #include "cim/Names.h"
 #include "model/Request.h"
 #include "schema/MofWriter.h"
+#include "provider/LogDouble.h"
 #include "support/AssetModel.h"
 #include "support/Values.h"
 
@@ -12,7 +14,8 @@
 #include <string>
 
 // Sequences of calls of the provider's function tables: responses, tables and files are those of a model of the
-// provider. Associations and the agent's identity change nothing.
+// provider. Associations and the agent's identity change nothing. With and without tracing, in which the provider finds
+// records in different ways, all responses are the same.
 
 fuzz::Interfaces fuzz::openInterfaces(const CMPIBroker* broker) {
     CMPIStatus status{CMPI_RC_OK, nullptr};
@@ -41,6 +44,34 @@ Expectation other(int rc) {
     return {rc, 0, rc != CMPI_RC_OK, {}};
 }
 
+std::string described(const cimhost::ObjectPath& path) {
+    std::string description = path.nameSpace + ":" + path.className;
+    for (const cimhost::NamedValue& key : path.keys) {
+        description += "," + key.name + "=" + cimhost::formatMof(key.value);
+    }
+    return description;
+}
+
+std::string described(const cimhost::Instance& instance) {
+    std::string description = described(instance.path);
+    for (const cimhost::NamedValue& property : instance.properties) {
+        const bool isNow = property.name == "LocalDateTime";
+        description += ";" + property.name + (isNow ? "" : "=" + cimhost::formatMof(property.value));
+    }
+    return description;
+}
+
+std::string described(const cimhost::ProviderResponse& response) {
+    std::string description = std::to_string(response.status.rc);
+    for (const auto& instance : cimhost::eventsOf<cimhost::Instance>(response.events)) {
+        description += "\n" + described(instance);
+    }
+    for (const auto& path : cimhost::eventsOf<cimhost::ObjectPath>(response.events)) {
+        description += "\n" + described(path);
+    }
+    return description;
+}
+
 /** A sequence of calls of the provider and the model. */
 class TestCase {
 public:
@@ -48,7 +79,9 @@ public:
 
     void perform(const Call& call) {
         const Expectation expected = expect(call);
+        logDouble::records.clear();
         const cimhost::ProviderResponse response = provider.perform(call);
+        allResponses += described(response) + "\n";
         try {
             requireResponse(call, expected, response);
             leases.requireAgreement();
@@ -69,6 +102,8 @@ public:
         records.replaceFile(content);
         perform({Event::restart});
     }
+
+    const std::string& responses() const { return allResponses; }
 
     bool isLarge() const { return std::max(leases.size(), warranties.size()) > mostRecords; }
 
@@ -163,15 +198,15 @@ private:
     }
 
     SystemUnderTest provider;
+    std::string allResponses{};
     ExpectedRecords leases{leaseStore()};
     ExpectedRecords warranties{warrantyStore()};
     ExpectedAsset asset{};
 };
 
-}  // namespace
-
-int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-    Bytes bytes(data, size);
+/** Runs a sequence and returns its responses. */
+std::string run(Bytes bytes, int tracedLevel) {
+    logDouble::admittedLevel = tracedLevel;
     TestCase test(bytes);
     for (std::size_t calls = 0; calls < mostCalls && !bytes.isAtEnd() && !test.isLarge(); ++calls) {
         if (bytes.below(16) == 0) {
@@ -180,5 +215,13 @@ int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
             test.perform(nextCall(bytes));
         }
     }
+    return test.responses();
+}
+
+}  // namespace
+
+int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
+    const Bytes bytes(data, size);
+    requireSame(run(bytes, 0), run(bytes, KO::Level::flow), "responses without and with tracing");
     return 0;
 }

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "FixedString.h"
+#include "IdentifierIndex.h"
 #include "Trace.h"
 
 #include <cstddef>
@@ -65,7 +66,8 @@ public:
     /** Rewrites the file from the table. Throws InstrumentationException if the file cannot be opened. */
     void flushCache();
 
-    std::vector<typename Traits::Unit> table{};  ///< in file order, then new records; includes deleted records
+    std::vector<typename Traits::Unit> table{};      ///< in file order, then new records; includes deleted records
+    IdentifierIndex<typename Traits::Unit> index{};  ///< of the table
 
 private:
     /** Frees the records read so far and logs the reason. */
@@ -113,6 +115,12 @@ public:
 
     /** Moves forward, starting at the current record, to the one with the identifier, byte for byte, or to the end. */
     void select(const std::string& instanceId);
+
+    /** Like select, but is not traced. */
+    void skipTo(const std::string& instanceId);
+
+    /** Returns whether the movements of a cursor may be traced. */
+    bool isTraced() const;
 
     /**
      * Appends a record with the identifier and default values. Moves a cursor that was at a record to the new one, and

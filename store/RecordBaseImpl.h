@@ -47,6 +47,7 @@ RecordCache<Traits>::RecordCache() noexcept {
     const Traced traced(at(Traits::traceSource, Level::flow, Traits::names.cacheName));
     try {
         loadRecords(dataFilePath(Traits::names.fileName), this->count(), table);
+        index.update(table);
     } catch (const std::bad_alloc&) {
         abandonLoading(at(Traits::traceSource, Level::error, Traits::names.cacheName), recordsExceedMemory);
     } catch (const std::exception& failure) {
@@ -142,10 +143,20 @@ void RecordBase<Traits>::operator++() {
 template <class Traits>
 void RecordBase<Traits>::select(const std::string& instanceId) {
     const Traced traced(at(Traits::traceSource, Level::flow, Traits::names.selectName), label::instanceId, instanceId);
-    const auto& table = Traits::cache().table;
-    while (cursor != end && !(table[cursor].inUse && table[cursor].InstanceID == instanceId)) {
-        skipTo(cursor + 1);
+    skipTo(instanceId);
+}
+
+template <class Traits>
+void RecordBase<Traits>::skipTo(const std::string& instanceId) {
+    if (cursor != end) {
+        const auto& cache = Traits::cache();
+        cursor = cache.index.find(cache.table, instanceId, cursor);
     }
+}
+
+template <class Traits>
+bool RecordBase<Traits>::isTraced() const {
+    return isWanted(at(Traits::traceSource));
 }
 
 template <class Traits>
@@ -153,12 +164,12 @@ bool RecordBase<Traits>::create(const std::string& instanceId) {
     const CallSite site = at(Traits::traceSource, Level::flow, Traits::names.createName);
     const Traced traced(site, label::instanceId, instanceId);
     auto& cache = Traits::cache();
-    const auto taken = [&](const Unit& unit) { return unit.inUse && unit.InstanceID == instanceId; };
-    if (std::any_of(cache.table.begin(), cache.table.end(), taken)) {
+    if (cache.index.find(cache.table, instanceId, 0) != cache.index.none) {
         fail<InstrumentationException>(here(site), Traits::names.identifierExists);
     }
     const bool stoodOnEntry = cursor != end;
     cache.table.push_back(Unit(instanceId));
+    cache.index.update(cache.table);
     ++cache.count();
     cacheModified = true;
     cursor = 0;

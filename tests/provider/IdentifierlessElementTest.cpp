@@ -13,6 +13,8 @@ public:
 
     operator bool() { return true; }
     void operator++() {}
+    bool isTraced() const { return true; }
+    void skipTo(const std::string&) {}
     bool create(const std::string&) { return true; }
     void remove() {}
     bool getProperty(Property, std::string&) const { return false; }

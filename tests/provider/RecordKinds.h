@@ -140,6 +140,7 @@ protected:
 
     static void emptyTable() {
         table().clear();
+        Kind::cache().index = {};
         count() = 0;
     }
 

@@ -41,8 +41,10 @@ protected:
 
     static void emptyTables() {
         LeaseBase::cache.table.clear();
+        LeaseBase::cache.index = {};
         LeaseBase::cache.recordCountLease = 0;
         WarrantyBase::cache.table.clear();
+        WarrantyBase::cache.index = {};
         WarrantyBase::cache.recordCountWarranty = 0;
     }
 

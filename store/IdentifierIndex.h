@@ -1,0 +1,101 @@
+#pragma once
+
+#include <cstddef>
+#include <functional>
+#include <limits>
+#include <new>
+#include <string>
+#include <vector>
+
+namespace KO::LeaseWarrantyProvider {
+
+/**
+ * Finds the records of a table by identifier in constant time: a hash table whose chains are in table order. Needs two
+ * words per record. Contains deleted records, too; an identifier may occur more than once.
+ */
+template <class Unit>
+class IdentifierIndex {
+public:
+    static constexpr std::size_t none = std::numeric_limits<std::size_t>::max();
+
+    /** Includes the records that were appended to the table. If memory is short, the index stays incomplete. */
+    void update(const std::vector<Unit>& table) noexcept;
+
+    /**
+     * Returns the position of the first record in use with the identifier, byte for byte, from a position on; `none` if
+     * there is none. Searches the table itself if the index is incomplete.
+     */
+    std::size_t find(const std::vector<Unit>& table, const std::string& identifier, std::size_t from) const;
+
+private:
+    void append(const std::vector<Unit>& table);
+    void rebuild(const std::vector<Unit>& table);
+    std::size_t chainOf(const std::string& identifier) const {
+        return std::hash<std::string>()(identifier) % heads.size();
+    }
+
+    std::vector<std::size_t> heads{};  ///< first position of each chain
+    std::vector<std::size_t> links{};  ///< per record, the next position of its chain
+};
+
+template <class Unit>
+void IdentifierIndex<Unit>::update(const std::vector<Unit>& table) noexcept {
+    try {
+        if (links.size() + 1 == table.size() && table.size() <= heads.size()) {
+            append(table);
+        } else if (links.size() != table.size()) {
+            rebuild(table);
+        }
+    } catch (const std::bad_alloc&) {
+        return;
+    }
+}
+
+template <class Unit>
+void IdentifierIndex<Unit>::append(const std::vector<Unit>& table) {
+    const std::size_t position = links.size();
+    links.push_back(none);
+    std::size_t* end = &heads[chainOf(table[position].InstanceID)];
+    while (*end != none) {
+        end = &links[*end];
+    }
+    *end = position;
+}
+
+/** Leaves room for as many records again. Starts with the last record, so that each is put at the head of its chain. */
+template <class Unit>
+void IdentifierIndex<Unit>::rebuild(const std::vector<Unit>& table) {
+    links.clear();
+    heads.assign(2 * table.size() + 1, none);
+    links.reserve(heads.size());
+    links.resize(table.size());
+    for (std::size_t position = table.size(); position-- > 0;) {
+        std::size_t& head = heads[chainOf(table[position].InstanceID)];
+        links[position] = head;
+        head = position;
+    }
+}
+
+template <class Unit>
+std::size_t IdentifierIndex<Unit>::find(const std::vector<Unit>& table, const std::string& identifier,
+                                        std::size_t from) const {
+    const auto matches = [&](std::size_t position) {
+        return table[position].inUse && table[position].InstanceID == identifier;
+    };
+    std::size_t position = from;
+    if (links.size() != table.size()) {
+        while (position < table.size() && !matches(position)) {
+            ++position;
+        }
+        return position < table.size() ? position : none;
+    }
+    // A walk over records with one identifier continues in their chain instead of at its head.
+    const bool continues = from > 0 && from <= table.size() && table[from - 1].InstanceID == identifier;
+    position = heads.empty() ? none : continues ? links[from - 1] : heads[chainOf(identifier)];
+    while (position != none && (position < from || !matches(position))) {
+        position = links[position];
+    }
+    return position;
+}
+
+}  // namespace KO::LeaseWarrantyProvider
