@@ -52,6 +52,17 @@ function(law_install_library target)
         NAMELINK_COMPONENT development)
 endfunction()
 
+# law_install_configuration(<file> <directory> <name> <component>)
+# A file in a directory of the system's configuration, where the administrator's version is kept.
+function(law_install_configuration file directory name component)
+    install(CODE "
+        set(new \"${file}\")
+        set(directory \"${CMAKE_INSTALL_SYSCONFDIR}/${directory}\")
+        set(name ${name})"
+        COMPONENT ${component})
+    install(SCRIPT ${PROJECT_SOURCE_DIR}/cmake/InstallConfiguration.cmake COMPONENT ${component})
+endfunction()
+
 # law_install_compressed(<file> <name> <directory> <component>)
 # Installs a manual page or changelog compressed. The compressed file contains no timestamp, so that it is
 # reproducible.

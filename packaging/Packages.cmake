@@ -139,11 +139,12 @@ Another agent's libraries with the same declarations can replace them.")
 set(CPACK_DEBIAN_AGENT_PACKAGE_PROVIDES ostrel-agent)
 
 law_package(host cimhost
-    DOCUMENTS cimhost.md
-    DESCRIPTION "runs CMPI providers without an object manager
-A small object manager for the command line: it loads a CMPI provider, sends
-it one request, prints the response as text, JSON or MOF, and exits. It
-reads classes from MOF files and providers from registrations in SFCB's format.")
+    DOCUMENTS cimhost.md serve.md serve-configuration.md
+    DESCRIPTION "object manager for CMPI providers
+On the command line, it loads a CMPI provider, sends it one request, prints the
+response as text, JSON or MOF, and exits. As a service, which is installed
+disabled, it serves CIM clients over HTTP with CIM-XML. It reads classes from
+MOF files and providers from registrations in SFCB's format.")
 set(CPACK_DEBIAN_HOST_PACKAGE_SUGGESTS lease-warranty-provider)
 
 set(version "${PROJECT_VERSION}-${CPACK_DEBIAN_PACKAGE_RELEASE}")

@@ -82,6 +82,23 @@ std::optional<std::int64_t> TableReader::number(std::string_view key, std::int64
     return value != nullptr ? std::optional<std::int64_t>(value->as_integer()) : std::nullopt;
 }
 
+std::optional<std::vector<std::string>> TableReader::strings(std::string_view key) {
+    const TomlValue* value = find(key);
+    if (value == nullptr) {
+        return std::nullopt;
+    }
+    const auto isString = [](const TomlValue& each) { return each.is_string(); };
+    if (!value->is_array() || !std::all_of(value->as_array().begin(), value->as_array().end(), isString)) {
+        reject(key, "must be an array of strings");
+        return std::nullopt;
+    }
+    std::vector<std::string> found;
+    for (const TomlValue& each : value->as_array()) {
+        found.push_back(each.as_string().str);
+    }
+    return found;
+}
+
 TableReader TableReader::table(std::string_view key) {
     const TomlValue* value = find(key, isTable, "must be a table");
     return TableReader(value != nullptr ? &value->as_table() : nullptr, nameOf(key), *problems);

@@ -44,6 +44,9 @@ public:
     /** An integer from minimum to maximum. */
     std::optional<std::int64_t> number(std::string_view key, std::int64_t minimum, std::int64_t maximum);
 
+    /** The strings of an array. */
+    std::optional<std::vector<std::string>> strings(std::string_view key);
+
     /** The table under a key; an empty one if there is none. */
     TableReader table(std::string_view key);
 

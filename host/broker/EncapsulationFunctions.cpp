@@ -21,6 +21,7 @@ Arena& arenaOf(const CMPIBroker* broker) {
 /** The keys of a path that are properties of the class. */
 std::vector<NamedValue> keyProperties(const ObjectPath& path, const ClassInfo& classInfo) {
     std::vector<NamedValue> properties;
+    properties.reserve(classInfo.properties.size());  // The provider sets the others next.
     for (const PropertyInfo& property : classInfo.properties) {
         const NamedValue* key = property.isKey ? findNamed(path.keys, property.name) : nullptr;
         if (key != nullptr) {

@@ -51,7 +51,7 @@ void removeInitial(InstanceContent& target, const std::string& name) {
 CMPIStatus setProperty(const CMPIInstance* instance, const char* name, const CMPIValue* value, CMPIType type) {
     return guarded([&] {
         InstanceContent& target = content(instance);
-        const std::string property = argument(name);
+        std::string property = argument(name);
         if (property.empty()) {
             throw Failure(CMPI_RC_ERR_INVALID_PARAMETER);
         }
@@ -59,7 +59,7 @@ CMPIStatus setProperty(const CMPIInstance* instance, const char* name, const CMP
         checkAgainstClass(target.classInfo.get(), property, converted);
         if (accepts(target, property)) {
             removeInitial(target, property);
-            setNamed(target.value.properties, property, std::move(converted));
+            setNamed(target.value.properties, std::move(property), std::move(converted));
         }
     });
 }

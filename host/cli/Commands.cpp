@@ -13,11 +13,13 @@
 namespace cimhost {
 namespace {
 
-ObjectManagerOptions managerOptions(const SearchPaths& paths, const Schema& schema, const CommandExtension& extension) {
+ObjectManagerOptions managerOptions(const SearchPaths& paths, const Schema& schema, const Arguments& arguments,
+                                    const CommandExtension& extension) {
     ObjectManagerOptions options;
     options.libraries.searchPath = paths.libraryPaths;
     options.classInfo = classInfos(schema);
     options.behaviour = extension.behaviour();
+    options.keepsEvents = arguments.raw;
     return options;
 }
 
@@ -132,7 +134,7 @@ CommandResult runRequest(const Arguments& arguments, const SearchPaths& paths, c
     try {
         Request request = buildRequest(arguments, schema);
         extension.adapt(request);
-        ObjectManager manager(managerOptions(paths, schema, extension), registry);
+        ObjectManager manager(managerOptions(paths, schema, arguments, extension), registry);
         const Response response = manager.perform(request);
         if (arguments.raw) {
             return {formattedRaw(response, arguments), rawStatus(response)};
@@ -172,7 +174,8 @@ CommandResult runCommand(const Arguments& arguments, CommandExtension& extension
         return runRequest(arguments, paths, schema, extension);
     }
     if (extension.hasCommand()) {
-        ObjectManager manager(managerOptions(paths, schema, extension), ProviderRegistry(readRegistrations(paths)));
+        ObjectManager manager(managerOptions(paths, schema, arguments, extension),
+                              ProviderRegistry(readRegistrations(paths)));
         return extension.run(manager, arguments, schema);
     }
     const std::vector<ListedClass> classes = listClasses(schema, readRegistrations(paths));

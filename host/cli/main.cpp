@@ -1,6 +1,7 @@
 #include "cli/Program.h"
+#include "cli/Serve.h"
 
 int main(int count, char** values) {
-    cimhost::CommandExtension none;
-    return cimhost::runProgram(count, values, {}, none);
+    cimhost::ServeCommand serve;
+    return cimhost::runProgram(count, values, serve.commandLine(), serve);
 }

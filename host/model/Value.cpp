@@ -67,7 +67,9 @@ Value Value::of(CMPIType type, Scalar scalar) {
     if (std::holds_alternative<std::monostate>(scalar)) {
         return null(type);
     }
-    return {type, false, false, {std::move(scalar)}};
+    Value value{type, false, false, {}};
+    value.elements.push_back(std::move(scalar));  // An initializer list would copy it.
+    return value;
 }
 
 Value Value::array(CMPIType type, std::vector<Scalar> elements) {

@@ -60,6 +60,7 @@ ObjectManager::ObjectManager(ObjectManagerOptions itsOptions, ProviderRegistry i
     : ownedBehaviour(std::move(itsOptions.behaviour)),
       behaviour(ownedBehaviour == nullptr ? ManagerBehaviour::standard() : *ownedBehaviour),
       policy(behaviour.policy()),
+      keepsEvents(itsOptions.keepsEvents),
       baseContext(std::move(itsOptions.context)),
       providers(std::move(itsRegistry)),
       itsBroker({std::move(itsOptions.classInfo), this, std::move(itsOptions.log), &behaviour.tables(),
@@ -147,7 +148,9 @@ Response ObjectManager::performForInstance(Request request) {
     if (!refusal.ok()) {
         return Response::failed(refusal);
     }
-    return mapResponses(behaviour, request, {call<CMPIInstanceMI>(*served, request)});
+    std::vector<ProviderResponse> responses;  // An initializer list would copy the response.
+    responses.push_back(call<CMPIInstanceMI>(*served, request));
+    return mapResponses(behaviour, request, std::move(responses), keepsEvents);
 }
 
 Response ObjectManager::performForAssociation(Request request) {
@@ -169,7 +172,7 @@ Response ObjectManager::performForAssociation(Request request) {
         }
         responses.push_back(call<CMPIAssociationMI>(*served, request));
     }
-    return mapResponses(behaviour, request, std::move(responses));
+    return mapResponses(behaviour, request, std::move(responses), keepsEvents);
 }
 
 std::vector<const ServedClass*> ObjectManager::associationsFor(const std::string& nameSpace,

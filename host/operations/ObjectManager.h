@@ -19,6 +19,7 @@ struct ObjectManagerOptions {
     std::function<void(const LogRecord&)> log{};          ///< none: log records are discarded
     ContextEntries context{};                             ///< entries of every request's context, such as CMPIPrincipal
     std::shared_ptr<const ManagerBehaviour> behaviour{};  ///< null: the standard behaviour
+    bool keepsEvents = true;  ///< whether Response::providers contains the events, which a large response copies
 };
 
 /**
@@ -87,6 +88,7 @@ private:
     std::shared_ptr<const ManagerBehaviour> ownedBehaviour;
     const ManagerBehaviour& behaviour;
     ProviderPolicy policy;
+    bool keepsEvents;
     ContextEntries baseContext;
     ProviderRegistry providers;
     Broker itsBroker;

@@ -43,6 +43,16 @@ void ProviderRegistry::add(ServedClass entry) {
     }
 }
 
+std::vector<std::string> ProviderRegistry::nameSpaces() const {
+    std::vector<std::string> found;
+    for (const ServedClass& each : entries) {
+        if (std::none_of(found.begin(), found.end(), [&](const auto& name) { return isIn(each, name); })) {
+            found.push_back(each.nameSpace);
+        }
+    }
+    return found;
+}
+
 bool ProviderRegistry::knowsNameSpace(std::string_view nameSpace) const {
     return std::any_of(entries.begin(), entries.end(), [&](const ServedClass& each) { return isIn(each, nameSpace); });
 }

@@ -36,6 +36,9 @@ public:
     /** Adds a registration, or replaces that for the same namespace, class and kind. */
     void add(const ProviderRegistration& registration);
 
+    /** All namespaces that registrations name, each once, in the order of the registrations. */
+    std::vector<std::string> nameSpaces() const;
+
     /** Whether a class is registered for the namespace. */
     bool knowsNameSpace(std::string_view nameSpace) const;
 

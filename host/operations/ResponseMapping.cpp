@@ -34,23 +34,28 @@ bool isExpected(const ResultEvent& event) {
            std::holds_alternative<ErrorInfo>(event) || std::holds_alternative<NullResult>(event);
 }
 
-/** Appends all results of this kind; an error if there are others. */
+/** Appends all results of this kind; an error if there are others. They leave the events, unless these are kept. */
 template <class Kind>
-Status collect(const std::vector<ProviderResponse>& responses, Operation operation, std::vector<Kind>& results) {
-    for (const ProviderResponse& response : responses) {
+Status collect(std::vector<ProviderResponse>& responses, Operation operation, bool keepsEvents,
+               std::vector<Kind>& results) {
+    for (ProviderResponse& response : responses) {
         if (!std::all_of(response.events.begin(), response.events.end(), isExpected<Kind>)) {
             results.clear();
             return {CMPI_RC_ERR_FAILED, std::string("The provider returned something other than an ") + kindName<Kind> +
                                             " for " + nameOf(operation) + "."};
         }
-        const std::vector<Kind> found = eventsOf<Kind>(response.events);
-        results.insert(results.end(), found.begin(), found.end());
+        results.reserve(results.size() + response.events.size());
+        for (ResultEvent& event : response.events) {
+            if (Kind* one = std::get_if<Kind>(&event)) {
+                results.push_back(keepsEvents ? Kind(*one) : std::move(*one));
+            }
+        }
     }
     return {};
 }
 
-Status collectOne(const Request& request, Response& response) {
-    Status status = collect(response.providers, request.operation, response.instances);
+Status collectOne(const Request& request, bool keepsEvents, Response& response) {
+    Status status = collect(response.providers, request.operation, keepsEvents, response.instances);
     if (status.ok() && response.instances.empty()) {
         return {CMPI_RC_ERR_NOT_FOUND, "There is no instance " + formatObjectPath(request.path) + "."};
     }
@@ -66,30 +71,31 @@ Status collectCreated(const ManagerBehaviour& behaviour, Response& response) {
     return created.status;
 }
 
-Status collectResults(const ManagerBehaviour& behaviour, const Request& request, Response& response) {
+Status collectResults(const ManagerBehaviour& behaviour, const Request& request, bool keepsEvents, Response& response) {
     switch (request.operation) {
         case Operation::getInstance:
-            return collectOne(request, response);
+            return collectOne(request, keepsEvents, response);
         case Operation::createInstance:
             return collectCreated(behaviour, response);
         case Operation::modifyInstance:
         case Operation::deleteInstance:
             return {};
         default:
-            return returnsPaths(request.operation) ? collect(response.providers, request.operation, response.paths)
-                                                   : collect(response.providers, request.operation, response.instances);
+            return returnsPaths(request.operation)
+                       ? collect(response.providers, request.operation, keepsEvents, response.paths)
+                       : collect(response.providers, request.operation, keepsEvents, response.instances);
     }
 }
 
 }  // namespace
 
 Response mapResponses(const ManagerBehaviour& behaviour, const Request& request,
-                      std::vector<ProviderResponse> responses) {
+                      std::vector<ProviderResponse> responses, bool keepsEvents) {
     Response response;
     response.providers = std::move(responses);
     response.status = statusOf(behaviour, response.providers, request.operation);
     if (response.ok()) {
-        response.status = collectResults(behaviour, request, response);
+        response.status = collectResults(behaviour, request, keepsEvents, response);
     }
     return response;
 }

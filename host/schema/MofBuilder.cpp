@@ -167,25 +167,36 @@ void MofBuilder::buildClass(const Node& node, const Node* qualifiers) {
 
 void MofBuilder::buildFeature(Class& declared, const Node& feature) const {
     const std::string name = findChild<mof::FeatureName>(feature)->string();
-    if (findChild<mof::ParameterList>(feature) != nullptr) {
-        declared.methods.push_back({name});
+    if (const Node* parameters = findChild<mof::ParameterList>(feature)) {
+        Method method{name};
+        method.type = intrinsicType(findChild<mof::DataType>(feature)->string_view()).value_or(CMPI_null);
+        method.qualifiers = readQualifiers(findChild<mof::QualifierList>(feature));
+        for (const Node* parameter : children<mof::Parameter>(*parameters)) {
+            method.parameters.push_back(readTypedName(findChild<mof::ParameterName>(*parameter)->string(), *parameter));
+        }
+        declared.methods.push_back(std::move(method));
         return;
     }
-    Property property{name};
-    const Node& type = *findChild<mof::DataType>(feature);
-    if (findChild<mof::ReferenceMark>(feature) != nullptr) {
-        property.type = CMPI_ref;
-        property.referenceClass = type.string();
-    } else {
-        property.type = readType(type);
-    }
-    property.isArray = findChild<mof::ArrayMark>(feature) != nullptr;
-    property.qualifiers = readQualifiers(findChild<mof::QualifierList>(feature));
+    Property property = readTypedName(name, feature);
     property.defaultValue = Value::null(property.type, property.isArray);
     if (const Node* value = findChild<mof::DefaultValue>(feature)) {
         property.defaultValue = readValue(*initializerOf(*value), property);
     }
     declared.properties.push_back(std::move(property));
+}
+
+Property MofBuilder::readTypedName(const std::string& name, const Node& node) const {
+    Property property{name};
+    const Node& type = *findChild<mof::DataType>(node);
+    if (findChild<mof::ReferenceMark>(node) != nullptr) {
+        property.type = CMPI_ref;
+        property.referenceClass = type.string();
+    } else {
+        property.type = readType(type);
+    }
+    property.isArray = findChild<mof::ArrayMark>(node) != nullptr;
+    property.qualifiers = readQualifiers(findChild<mof::QualifierList>(node));
+    return property;
 }
 
 std::vector<Qualifier> MofBuilder::readQualifiers(const Node* list) const {

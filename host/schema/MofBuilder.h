@@ -31,6 +31,8 @@ private:
     void buildInstance(const grammar::Node& node);
     NamedValue buildAssignment(const grammar::Node& assignment, const Class& declared) const;
 
+    /** Name, type and qualifiers of a property or a parameter. */
+    Property readTypedName(const std::string& name, const grammar::Node& node) const;
     std::vector<Qualifier> readQualifiers(const grammar::Node* list) const;
     Qualifier readQualifier(const grammar::Node& node) const;
     Value readValue(const grammar::Node& initializer, const Property& type) const;

@@ -116,10 +116,11 @@ struct LoneArray : peg::seq<Skip, peg::must<ArrayInitializer>, peg::must<LoneArr
 template <typename Rule>
 using Selected = peg::parse_tree::selector<
     Rule, LiteralNodes,
-    peg::parse_tree::store_content::on<
-        StringPart, Alias, Constant, ArrayInitializer, DefaultValue, FlavorName, QualifierName, Qualifier,
-        QualifierList, DataType, FeatureName, ArraySize, ReferenceMark, ArrayMark, ParameterList, Feature, ClassName,
-        SuperclassName, ClassDeclaration, AssignedName, Assignment, InstanceDeclaration, QualifierDeclaration,
-        FlavorClause, PragmaName, Pragma, QualifiedDeclaration, AliasClause>>;
+    peg::parse_tree::store_content::on<StringPart, Alias, Constant, ArrayInitializer, DefaultValue, FlavorName,
+                                       QualifierName, Qualifier, QualifierList, DataType, FeatureName, ArraySize,
+                                       ReferenceMark, ArrayMark, Parameter, ParameterName, ParameterList, Feature,
+                                       ClassName, SuperclassName, ClassDeclaration, AssignedName, Assignment,
+                                       InstanceDeclaration, QualifierDeclaration, FlavorClause, PragmaName, Pragma,
+                                       QualifiedDeclaration, AliasClause>>;
 
 }  // namespace cimhost::grammar::mof

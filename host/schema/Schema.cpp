@@ -20,7 +20,14 @@ void inheritQualifiers(std::vector<Qualifier>& own, const std::vector<Qualifier>
     for (const Qualifier& qualifier : inherited) {
         if (qualifier.flavor.toSubclass && findNamed(own, qualifier.name) == nullptr) {
             own.push_back(qualifier);
+            own.back().isPropagated = true;
         }
+    }
+}
+
+void markPropagated(std::vector<Qualifier>& qualifiers) {
+    for (Qualifier& qualifier : qualifiers) {
+        qualifier.isPropagated = true;
     }
 }
 
@@ -51,6 +58,9 @@ void checkUnique(const Class& declared, const std::vector<Element>& elements, co
 /** The properties of the superclass, overridden by those of the class, then the other properties of the class. */
 std::vector<Property> mergeProperties(const Class& declared, const Class& super) {
     std::vector<Property> merged = super.properties;
+    for (Property& inherited : merged) {
+        markPropagated(inherited.qualifiers);
+    }
     for (const Property& own : declared.properties) {
         const auto inherited = std::find_if(merged.begin(), merged.end(),
                                             [&](const Property& each) { return cim::sameName(each.name, own.name); });
@@ -69,9 +79,14 @@ std::vector<Property> mergeProperties(const Class& declared, const Class& super)
 std::vector<Method> mergeMethods(const Class& declared, const Class& super) {
     std::vector<Method> merged = declared.methods;
     for (const Method& inherited : super.methods) {
-        if (findNamed(merged, inherited.name) == nullptr) {
-            merged.push_back(inherited);
+        const auto overriding = std::find_if(
+            merged.begin(), merged.end(), [&](const Method& own) { return cim::sameName(own.name, inherited.name); });
+        if (overriding != merged.end()) {
+            inheritQualifiers(overriding->qualifiers, inherited.qualifiers);
+            continue;
         }
+        merged.push_back(inherited);
+        markPropagated(merged.back().qualifiers);
     }
     return merged;
 }
@@ -173,6 +188,14 @@ const Class& Schema::add(Class declared) {
 const QualifierDeclaration* Schema::findQualifier(std::string_view name) const {
     const auto found = qualifierDeclarations.find(name);
     return found == qualifierDeclarations.end() ? nullptr : &found->second;
+}
+
+std::vector<const QualifierDeclaration*> Schema::qualifiers() const {
+    std::vector<const QualifierDeclaration*> found;
+    for (const auto& [name, declaration] : qualifierDeclarations) {
+        found.push_back(&declaration);
+    }
+    return found;
 }
 
 void Schema::add(QualifierDeclaration declaration) {

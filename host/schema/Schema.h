@@ -23,6 +23,7 @@ struct Qualifier {
     std::string name{};
     Value value{};
     Flavor flavor{};
+    bool isPropagated = false;  ///< inherited from a superclass, not declared
 };
 
 /** Declaration of a qualifier: type and default value. */
@@ -55,10 +56,13 @@ struct Property {
     bool isWritable() const;
 };
 
-/** The name of a method; this host does not call methods. */
+/** A method with its parameters; this host does not call methods. */
 struct Method {
     std::string name{};
     std::string origin{};
+    CMPIType type = CMPI_null;  ///< of the return value
+    std::vector<Qualifier> qualifiers{};
+    std::vector<Property> parameters{};
 };
 
 /** A class with all its properties: inherited ones first, then those it declares, in the order of declaration. */
@@ -106,7 +110,10 @@ public:
 
     const QualifierDeclaration* findQualifier(std::string_view name) const;
 
-    /** Adds a declaration. @throws std::invalid_argument if it exists and is not that of a standard qualifier */
+    /** All qualifier declarations, by name. */
+    std::vector<const QualifierDeclaration*> qualifiers() const;
+
+    /** Adds a declaration; a standard one may be given again, any other with the same name is std::invalid_argument. */
     void add(QualifierDeclaration declaration);
 
     /** The instances of MOF files ("instance of"), in order. */

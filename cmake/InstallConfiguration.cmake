@@ -1,13 +1,12 @@
-# Installs the configuration file "new" into "directory", absolute or relative to the prefix. If another version is
-# installed, it may have the administrator's changes: it is kept, and the new one is installed as agent.toml.new.
+# Installs the configuration file "new" as "name" into "directory", absolute or relative to the prefix. If another version
+# is installed, it may have the administrator's changes: it is kept, and the new one is installed as NAME.new.
 cmake_path(ABSOLUTE_PATH directory BASE_DIRECTORY "${CMAKE_INSTALL_PREFIX}")
-set(kept "$ENV{DESTDIR}${directory}/agent.toml")
-set(name agent.toml)
+set(kept "$ENV{DESTDIR}${directory}/${name}")
 if(EXISTS "${kept}")
     file(SHA256 "${kept}" hash_of_kept)
     file(SHA256 "${new}" hash_of_new)
     if(NOT hash_of_kept STREQUAL hash_of_new)
-        set(name agent.toml.new)
+        string(APPEND name .new)
         message(STATUS "Keeping ${kept}; the new one is ${name}")
     endif()
 endif()

@@ -1,0 +1,30 @@
+#pragma once
+
+#include <stdexcept>
+#include <string>
+#include <utility>
+
+#include "model/Status.h"
+
+namespace cimhost::cimxml {
+
+/** An operation that fails with a CIM status. */
+class CimError : public std::runtime_error {
+public:
+    CimError(int itsCode, const std::string& message) : std::runtime_error(message), code(itsCode) {}
+    explicit CimError(const Status& status) : CimError(status.rc, status.message) {}
+
+    int code;
+};
+
+/** A request that is refused before its operation is known, with an HTTP status and a value of the header CIMError. */
+class RequestRefused : public std::runtime_error {
+public:
+    RequestRefused(unsigned status, std::string error, const std::string& message)
+        : std::runtime_error(message), httpStatus(status), cimError(std::move(error)) {}
+
+    unsigned httpStatus;
+    std::string cimError;  ///< empty: no such header
+};
+
+}  // namespace cimhost::cimxml

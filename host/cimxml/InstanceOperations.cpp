@@ -1,0 +1,170 @@
+#include <algorithm>
+
+#include "broker/NamedValues.h"
+#include "cim/Names.h"
+#include "cimxml/Errors.h"
+#include "cimxml/Operations.h"
+#include "schema/ObjectPathText.h"
+
+namespace cimhost::cimxml {
+namespace {
+
+/** An object path must be that of an instance: each key has a value. */
+void requireKeys(const ObjectPath& path, const Schema& schema) {
+    const Class* known = schema.findClass(path.className);
+    for (const Property* key : known != nullptr ? known->keys() : std::vector<const Property*>()) {
+        if (findNamed(path.keys, key->name) == nullptr) {
+            throw CimError(CMPI_RC_ERR_INVALID_PARAMETER, "Key " + key->name + " of the path is missing.");
+        }
+    }
+}
+
+void requireRepresentable(const Response& response) {
+    for (const Instance& each : response.instances) {
+        cimxml::requireRepresentable(each);
+    }
+    for (const ObjectPath& each : response.paths) {
+        cimxml::requireRepresentable(each);
+    }
+}
+
+}  // namespace
+
+Response Operations::send(const Call& call, Request request) const {
+    ContextEntries context;
+    if (!call.caller.principal.empty()) {
+        context.push_back({CMPIPrincipal, Value::of(call.caller.principal)});
+    }
+    Response response = call.target.perform(request.with(std::move(context)));
+    if (!response.ok()) {
+        throw CimError(response.status);
+    }
+    response.providers.clear();
+    requireRepresentable(response);
+    return response;
+}
+
+Response Operations::enumerate(const Call& call, Request request) const {
+    const ObjectPath path = request.path;
+    std::vector<std::string> names{path.className};
+    for (const Class* subclass : call.schema.subclasses(path.className)) {
+        names.push_back(subclass->name);
+    }
+    Response all;
+    bool isServed = call.schema.findClass(path.className) != nullptr;
+    for (const std::string& name : names) {
+        const bool hasProvider = registry.find(path.nameSpace, name, InterfaceKind::instance) != nullptr;
+        if (!hasProvider && !call.isInterop) {
+            continue;
+        }
+        isServed = isServed || hasProvider;
+        request.path.className = name;
+        Response response = send(call, request);
+        std::move(response.instances.begin(), response.instances.end(), std::back_inserter(all.instances));
+        std::move(response.paths.begin(), response.paths.end(), std::back_inserter(all.paths));
+    }
+    if (!isServed) {
+        throw CimError(CMPI_RC_ERR_INVALID_CLASS, "There is no class " + path.className + ".");
+    }
+    return all;
+}
+
+ResultCursor Operations::enumeration(const Call& call) const {
+    Request request;
+    request.operation = call.operation;
+    request.path.nameSpace = call.arguments.nameSpace();
+    request.path.className = call.arguments.requiredClassName("ClassName");
+    InstanceParts parts = partsOf(call);
+    request.properties = parts.properties;
+    if (!call.arguments.flag("DeepInheritance", true)) {
+        parts.onlyOf = call.schema.findClass(request.path.className);
+    }
+    return {enumerate(call, std::move(request)), call.form, std::move(parts)};
+}
+
+InstanceParts Operations::partsOf(const Call& call) const {
+    InstanceParts parts;
+    parts.properties = call.arguments.strings("PropertyList");
+    parts.origins = call.arguments.flag("IncludeClassOrigin", false) ? &call.schema : nullptr;
+    return parts;
+}
+
+OperationResult Operations::streamed(const Call& call, ResultCursor cursor) const {
+    OperationResult result;
+    result.count = cursor.left();
+    result.next = [writer = writerFor(call),
+                   cursor = std::make_shared<ResultCursor>(std::move(cursor))](std::string& xml) {
+        if (cursor->left() == 0) {
+            return false;
+        }
+        cursor->append(xml, writer);
+        return true;
+    };
+    return result;
+}
+
+OperationResult Operations::enumerateInstances(const Call& call) {
+    return streamed(call, enumeration(call));
+}
+
+OperationResult Operations::getInstance(const Call& call) {
+    const InstanceParts parts = partsOf(call);
+    const ObjectPath path = call.arguments.path("InstanceName");
+    requireKeys(path, call.schema);
+    return streamed(call, {send(call, Request::getInstance(path, parts.properties)), ObjectForm::instance, parts});
+}
+
+OperationResult Operations::createInstance(const Call& call) {
+    const Instance instance = call.arguments.reader().instance(call.arguments.required("NewInstance"));
+    ResultCursor created{send(call, Request::createInstance(instance.path, instance)), ObjectForm::instanceName};
+    return streamed(call, std::move(created));
+}
+
+OperationResult Operations::modifyInstance(const Call& call) {
+    const Instance modified = call.arguments.reader().namedInstance(call.arguments.required("ModifiedInstance"));
+    requireKeys(modified.path, call.schema);
+    send(call, Request::modifyInstance(modified.path, modified, call.arguments.strings("PropertyList")));
+    return {};
+}
+
+OperationResult Operations::deleteInstance(const Call& call) {
+    const ObjectPath path = call.arguments.path("InstanceName");
+    requireKeys(path, call.schema);
+    send(call, Request::deleteInstance(path));
+    return {};
+}
+
+/** Providers are called for the association class, of which there must be at least one with a provider. */
+Response Operations::associate(const Call& call, Request request) const {
+    const bool isReference = isReferenceOperation(request.operation);
+    const auto& wanted = isReference ? request.filter.resultClass : request.filter.associationClass;
+    for (const auto& name : {request.filter.resultClass, request.filter.associationClass}) {
+        if (name && call.schema.findClass(*name) == nullptr) {
+            throw CimError(CMPI_RC_ERR_INVALID_PARAMETER, "There is no class " + *name + ".");
+        }
+    }
+    const std::vector<const ServedClass*> served = registry.associations(request.path.nameSpace);
+    const bool hasProvider = std::any_of(served.begin(), served.end(), [&](const ServedClass* each) {
+        return !wanted || call.schema.isA(each->className, *wanted);
+    });
+    return hasProvider ? send(call, std::move(request)) : Response{};
+}
+
+ResultCursor Operations::traversal(const Call& call, const ObjectPath& path) const {
+    requireKeys(path, call.schema);
+    classOf(call, path.className);
+    Request request;
+    request.operation = call.operation;
+    request.path = path;
+    request.filter = call.arguments.filter();
+    request.properties = call.arguments.strings("PropertyList");
+    return {associate(call, std::move(request)), call.form, partsOf(call)};
+}
+
+OperationResult Operations::traverse(const Call& call) {
+    const ObjectPath path = call.arguments.path("ObjectName");
+    const bool isClass = call.arguments.required("ObjectName").name == "CLASSNAME";
+    return isClass ? traverseClasses(call, path) : streamed(call, traversal(call, path));
+}
+
+}  // namespace cimhost::cimxml

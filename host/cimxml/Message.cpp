@@ -1,0 +1,144 @@
+#include "cimxml/Message.h"
+
+#include <algorithm>
+#include <cctype>
+
+#include "cim/Names.h"
+#include "cimxml/Errors.h"
+
+namespace cimhost::cimxml {
+namespace {
+
+constexpr unsigned badRequest = 400;
+constexpr unsigned notImplemented = 501;
+
+[[noreturn]] void invalid(const std::string& why) {
+    throw RequestRefused(badRequest, "request-not-valid", why);
+}
+
+[[noreturn]] void notLooselyValid(const std::string& why) {
+    throw RequestRefused(badRequest, "request-not-loosely-valid", why);
+}
+
+const XmlElement& childOf(const XmlElement& parent, std::string_view name) {
+    const XmlElement* child = parent.child(name);
+    if (child == nullptr) {
+        notLooselyValid("Element " + parent.name + " has no " + std::string(name) + ".");
+    }
+    return *child;
+}
+
+const std::string& attributeOf(const XmlElement& element, std::string_view name) {
+    const std::string* value = element.attribute(name);
+    if (value == nullptr) {
+        notLooselyValid("Element " + element.name + " has no attribute " + std::string(name) + ".");
+    }
+    return *value;
+}
+
+/** Accepts versions of a major number, "2.x"; later minor versions are compatible. */
+void checkVersion(const XmlElement& element, std::string_view attribute, char major, const char* error) {
+    const std::string& version = attributeOf(element, attribute);
+    const bool isKnown = version.size() > 2 && version[0] == major && version[1] == '.' &&
+                         std::all_of(version.begin() + 2, version.end(),
+                                     [](unsigned char digit) { return std::isdigit(digit) != 0 || digit == '.'; });
+    if (!isKnown) {
+        throw RequestRefused(badRequest, error,
+                             std::string(attribute) + " " + version + " is not supported; send " + major + ".0.");
+    }
+}
+
+const XmlElement& requestOf(const XmlElement& message) {
+    if (message.child("MULTIREQ") != nullptr) {
+        throw RequestRefused(notImplemented, "multiple-requests-unsupported",
+                             "Several operations in one message are not supported.");
+    }
+    if (message.child("SIMPLEEXPREQ") != nullptr || message.child("MULTIEXPREQ") != nullptr) {
+        throw RequestRefused(notImplemented, "unsupported-operation", "Export messages are not supported.");
+    }
+    return childOf(message, "SIMPLEREQ");
+}
+
+void readParameters(Message& message, const XmlElement& call, std::string_view elementName) {
+    for (const XmlElement& each : call.children) {
+        if (each.name != elementName) {
+            continue;
+        }
+        const std::string& name = attributeOf(each, "NAME");
+        if (message.find(name) != nullptr) {
+            invalid("Parameter " + name + " is there twice.");
+        }
+        message.parameters.emplace_back(name, each.children.empty() ? XmlElement{} : each.children.front());
+    }
+}
+
+/** Reads the target of a method: LOCALCLASSPATH or LOCALINSTANCEPATH. */
+void readTarget(Message& message, const XmlElement& call) {
+    const XmlElement* path = call.child("LOCALCLASSPATH");
+    const bool isClass = path != nullptr;
+    if (!isClass) {
+        path = &childOf(call, "LOCALINSTANCEPATH");
+    }
+    message.nameSpace = nameSpaceOf(childOf(*path, "LOCALNAMESPACEPATH"));
+    message.target = childOf(*path, isClass ? "CLASSNAME" : "INSTANCENAME");
+    message.object = message.nameSpace + ":" + attributeOf(message.target, isClass ? "NAME" : "CLASSNAME");
+}
+
+void readCall(Message& message, const XmlElement& request) {
+    if (const XmlElement* call = request.child("IMETHODCALL")) {
+        message.method = attributeOf(*call, "NAME");
+        message.nameSpace = nameSpaceOf(childOf(*call, "LOCALNAMESPACEPATH"));
+        message.object = message.nameSpace;
+        readParameters(message, *call, "IPARAMVALUE");
+        return;
+    }
+    const XmlElement& call = childOf(request, "METHODCALL");
+    message.isIntrinsic = false;
+    message.method = attributeOf(call, "NAME");
+    readTarget(message, call);
+    readParameters(message, call, "PARAMVALUE");
+}
+
+}  // namespace
+
+const XmlElement* Message::find(std::string_view parameter) const {
+    const auto found = std::find_if(parameters.begin(), parameters.end(),
+                                    [&](const auto& each) { return cim::sameName(each.first, parameter); });
+    return found == parameters.end() || found->second.name.empty() ? nullptr : &found->second;
+}
+
+std::string nameSpaceOf(const XmlElement& localNameSpacePath) {
+    std::string nameSpace;
+    for (const XmlElement& each : localNameSpacePath.children) {
+        if (each.name == "NAMESPACE") {
+            nameSpace += (nameSpace.empty() ? "" : "/") + attributeOf(each, "NAME");
+        }
+    }
+    if (nameSpace.empty()) {
+        notLooselyValid("A LOCALNAMESPACEPATH has no NAMESPACE.");
+    }
+    return nameSpace;
+}
+
+Message readMessage(std::string_view document, const XmlLimits& limits) {
+    XmlElement root;
+    try {
+        root = parseXml(document, limits);
+    } catch (const XmlError& error) {
+        throw RequestRefused(badRequest, "request-not-well-formed", error.what());
+    }
+    if (root.name != "CIM") {
+        notLooselyValid("The root element is " + root.name + ", not CIM.");
+    }
+    checkVersion(root, "CIMVERSION", '2', "unsupported-cim-version");
+    checkVersion(root, "DTDVERSION", '2', "unsupported-dtd-version");
+    const XmlElement& element = childOf(root, "MESSAGE");
+    checkVersion(element, "PROTOCOLVERSION", '1', "unsupported-protocol-version");
+    Message message;
+    message.id = attributeOf(element, "ID");
+    message.protocolVersion = attributeOf(element, "PROTOCOLVERSION");
+    readCall(message, requestOf(element));
+    return message;
+}
+
+}  // namespace cimhost::cimxml

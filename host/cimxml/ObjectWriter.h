@@ -1,0 +1,76 @@
+#pragma once
+
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "model/Request.h"
+#include "model/Value.h"
+#include "schema/Schema.h"
+
+namespace cimhost::cimxml {
+
+/** The form of an instance or a path in a response. */
+enum class ObjectForm {
+    instance,          ///< INSTANCE
+    namedInstance,     ///< VALUE.NAMEDINSTANCE
+    instanceWithPath,  ///< VALUE.INSTANCEWITHPATH
+    objectWithPath,    ///< VALUE.OBJECTWITHPATH
+    instanceName,      ///< INSTANCENAME
+    instancePath,      ///< INSTANCEPATH
+    objectPath         ///< OBJECTPATH
+};
+
+/** The parts of an instance to write. */
+struct InstanceParts {
+    PropertyList properties{};        ///< only these; none: all
+    const Class* onlyOf = nullptr;    ///< only properties that this class has; null: all
+    const Schema* origins = nullptr;  ///< writes the class origin of properties from this schema; null: none
+};
+
+/** Appends CIM objects as CIM-XML elements to a string. */
+class ObjectWriter {
+public:
+    /**
+     * @param itsHost      host of paths that have none
+     * @param itsNameSpace of paths that have none
+     */
+    ObjectWriter(std::string itsHost, std::string itsNameSpace)
+        : host(std::move(itsHost)), nameSpace(std::move(itsNameSpace)) {}
+
+    void append(std::string& xml, const Instance& instance, ObjectForm form, const InstanceParts& parts = {}) const;
+    void append(std::string& xml, const ObjectPath& path, ObjectForm form) const;
+
+    void appendInstance(std::string& xml, const Instance& instance, const InstanceParts& parts = {}) const;
+    void appendInstanceName(std::string& xml, const ObjectPath& path) const;
+    void appendInstancePath(std::string& xml, const ObjectPath& path) const;
+
+    /** NAMESPACEPATH with the name of a class: CLASSPATH. */
+    void appendClassPath(std::string& xml, const std::string& className) const;
+
+    /** VALUE, VALUE.ARRAY, VALUE.REFERENCE or VALUE.REFARRAY; nothing for null. */
+    void appendValue(std::string& xml, const Value& value) const;
+
+private:
+    void appendNameSpacePath(std::string& xml, const ObjectPath& path) const;
+    void appendLocalNameSpacePath(std::string& xml, const std::string& itsNameSpace) const;
+    void appendKey(std::string& xml, const NamedValue& key) const;
+    void appendReference(std::string& xml, const ObjectPath& path) const;
+    void appendProperty(std::string& xml, const NamedValue& property, const Property* declared) const;
+    void appendScalar(std::string& xml, const Scalar& scalar) const;
+
+    std::string host;
+    std::string nameSpace;
+};
+
+/** A value of a simple type as its characters, not escaped. */
+std::string charactersOf(const Scalar& scalar);
+
+/**
+ * Checks that XML can represent all strings of an instance or a path.
+ * @throws CimError naming class and property
+ */
+void requireRepresentable(const Instance& instance);
+void requireRepresentable(const ObjectPath& path);
+
+}  // namespace cimhost::cimxml

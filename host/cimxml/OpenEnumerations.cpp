@@ -1,0 +1,77 @@
+#include "cimxml/OpenEnumerations.h"
+
+#include <sys/random.h>
+
+#include <array>
+#include <cerrno>
+#include <system_error>
+
+#include "cim/Names.h"
+
+namespace cimhost::cimxml {
+namespace {
+
+/** An identifier that other clients cannot guess. */
+std::string randomIdentifier() {
+    std::array<unsigned char, 16> bytes{};
+    if (::getrandom(bytes.data(), bytes.size(), 0) != static_cast<ssize_t>(bytes.size())) {
+        throw std::system_error(errno, std::generic_category(), "no random number is available");
+    }
+    constexpr auto digits = "0123456789abcdef";
+    std::string identifier;
+    for (const unsigned char byte : bytes) {
+        identifier += digits[byte >> 4U];
+        identifier += digits[byte & 0xFU];
+    }
+    return identifier;
+}
+
+}  // namespace
+
+std::optional<std::string> OpenEnumerations::keep(OpenEnumeration enumeration, std::string identifier,
+                                                  Clock::time_point now) {
+    const std::lock_guard<std::mutex> lock(mutex);
+    erase(now);
+    if (identifier.empty()) {
+        if (kept.size() >= limits.open) {
+            return std::nullopt;
+        }
+        identifier = randomIdentifier();
+    }
+    const Clock::time_point expires = now + enumeration.timeout;
+    kept.insert_or_assign(identifier, Kept{std::move(enumeration), expires});
+    return identifier;
+}
+
+std::optional<OpenEnumeration> OpenEnumerations::take(const std::string& identifier, const std::string& nameSpace,
+                                                      const std::string& principal, Clock::time_point now) {
+    const std::lock_guard<std::mutex> lock(mutex);
+    erase(now);
+    const auto found = kept.find(identifier);
+    if (found == kept.end() || !cim::sameName(found->second.enumeration.nameSpace, nameSpace) ||
+        found->second.enumeration.principal != principal) {
+        return std::nullopt;
+    }
+    OpenEnumeration enumeration = std::move(found->second.enumeration);
+    kept.erase(found);
+    return enumeration;
+}
+
+std::size_t OpenEnumerations::size() const {
+    const std::lock_guard<std::mutex> lock(mutex);
+    return kept.size();
+}
+
+void OpenEnumerations::removeExpired(Clock::time_point now) {
+    const std::lock_guard<std::mutex> lock(mutex);
+    erase(now);
+}
+
+/** Erases expired enumerations, with the mutex locked. */
+void OpenEnumerations::erase(Clock::time_point now) {
+    for (auto each = kept.begin(); each != kept.end();) {
+        each = each->second.expires <= now ? kept.erase(each) : std::next(each);
+    }
+}
+
+}  // namespace cimhost::cimxml

@@ -1,0 +1,90 @@
+#pragma once
+
+#include <chrono>
+#include <cstddef>
+#include <cstdint>
+#include <map>
+#include <memory>
+#include <mutex>
+#include <optional>
+#include <string>
+
+#include "cimxml/ObjectWriter.h"
+#include "model/Response.h"
+
+namespace cimhost::cimxml {
+
+/** Results of an operation, and how far a client has read them. */
+struct ResultCursor {
+    Response results{};
+    ObjectForm form = ObjectForm::instance;
+    InstanceParts parts{};
+    std::size_t next = 0;
+
+    bool holdsPaths() const { return form >= ObjectForm::instanceName; }
+    std::size_t size() const { return holdsPaths() ? results.paths.size() : results.instances.size(); }
+    std::size_t left() const { return size() - next; }
+
+    /** Appends the next result. */
+    void append(std::string& xml, const ObjectWriter& writer) {
+        if (holdsPaths()) {
+            writer.append(xml, results.paths[next], form);
+        } else {
+            writer.append(xml, results.instances[next], form, parts);
+        }
+        ++next;
+    }
+};
+
+/** An enumeration that a client has opened and may continue to pull. */
+struct OpenEnumeration {
+    ResultCursor cursor{};
+    std::string nameSpace{};
+    std::string principal{};  ///< only this user may continue
+    std::chrono::seconds timeout{};
+};
+
+struct EnumerationLimits {
+    std::size_t open = 100;            ///< enumerations open at the same time
+    std::chrono::seconds timeout{60};  ///< for clients that ask for none
+    std::chrono::seconds longestTimeout{600};
+    std::uint32_t mostObjects = 10'000;  ///< of one pull
+};
+
+/** The open enumerations of all clients. Safe to use from several threads. */
+class OpenEnumerations {
+public:
+    using Clock = std::chrono::steady_clock;
+
+    explicit OpenEnumerations(const EnumerationLimits& itsLimits) : limits(itsLimits) {}
+
+    /**
+     * Keeps an enumeration until it is taken or its timeout has passed.
+     * @param identifier the one that it had before; empty for a new enumeration
+     * @return its identifier; none if too many enumerations are open
+     */
+    std::optional<std::string> keep(OpenEnumeration enumeration, std::string identifier, Clock::time_point now);
+
+    /** Removes and returns an enumeration; none if the client has no open enumeration of that identifier. */
+    std::optional<OpenEnumeration> take(const std::string& identifier, const std::string& nameSpace,
+                                        const std::string& principal, Clock::time_point now);
+
+    /** Frees the results of enumerations whose timeout has passed. */
+    void removeExpired(Clock::time_point now);
+
+    std::size_t size() const;
+
+private:
+    struct Kept {
+        OpenEnumeration enumeration;
+        Clock::time_point expires;
+    };
+
+    void erase(Clock::time_point now);
+
+    EnumerationLimits limits;
+    mutable std::mutex mutex;
+    std::map<std::string, Kept> kept;
+};
+
+}  // namespace cimhost::cimxml

@@ -1,0 +1,116 @@
+#include "cimxml/OperationArguments.h"
+
+#include <sstream>
+
+#include "cim/Names.h"
+#include "cimxml/Errors.h"
+#include "schema/Errors.h"
+
+namespace cimhost::cimxml {
+namespace {
+
+[[noreturn]] void invalid(std::string_view name, const std::string& why) {
+    throw CimError(CMPI_RC_ERR_INVALID_PARAMETER, "Parameter " + std::string(name) + " " + why + ".");
+}
+
+const std::string& valueOf(std::string_view name, const XmlElement& element) {
+    if (element.name != "VALUE" || !element.children.empty()) {
+        invalid(name, "is not a single value");
+    }
+    return element.characters;
+}
+
+}  // namespace
+
+void OperationArguments::requireKnown(std::string_view names) const {
+    for (const auto& [name, element] : message.parameters) {
+        std::istringstream known{std::string(names)};
+        std::string each;
+        bool isKnown = false;
+        while (!isKnown && known >> each) {
+            isKnown = cim::sameName(each, name);
+        }
+        if (!isKnown) {
+            invalid(name, "is not one of " + message.method);
+        }
+    }
+}
+
+bool OperationArguments::flag(std::string_view name, bool absent) const {
+    const XmlElement* element = message.find(name);
+    if (element == nullptr) {
+        return absent;
+    }
+    try {
+        return std::get<bool>(scalarFrom(valueOf(name, *element), CMPI_boolean));
+    } catch (const ValueError& error) {
+        invalid(name, std::string("is wrong: ") + error.what());
+    }
+}
+
+std::optional<std::uint32_t> OperationArguments::number(std::string_view name) const {
+    const XmlElement* element = message.find(name);
+    if (element == nullptr) {
+        return std::nullopt;
+    }
+    try {
+        return std::get<std::uint32_t>(scalarFrom(valueOf(name, *element), CMPI_uint32));
+    } catch (const ValueError& error) {
+        invalid(name, std::string("is wrong: ") + error.what());
+    }
+}
+
+std::optional<std::string> OperationArguments::string(std::string_view name) const {
+    const XmlElement* element = message.find(name);
+    return element == nullptr ? std::nullopt : std::optional(valueOf(name, *element));
+}
+
+PropertyList OperationArguments::strings(std::string_view name) const {
+    const XmlElement* element = message.find(name);
+    if (element == nullptr) {
+        return std::nullopt;
+    }
+    if (element->name != "VALUE.ARRAY") {
+        invalid(name, "is not an array");
+    }
+    std::vector<std::string> values;
+    for (const XmlElement& each : element->children) {
+        values.push_back(valueOf(name, each));
+    }
+    return values;
+}
+
+std::optional<std::string> OperationArguments::className(std::string_view name) const {
+    const XmlElement* element = message.find(name);
+    if (element == nullptr) {
+        return std::nullopt;
+    }
+    if (element->name != "CLASSNAME") {
+        invalid(name, "is not a class name");
+    }
+    return elements.path(*element).className;
+}
+
+std::string OperationArguments::requiredClassName(std::string_view name) const {
+    required(name);
+    return *className(name);
+}
+
+std::string OperationArguments::requiredString(std::string_view name) const {
+    required(name);
+    return *string(name);
+}
+
+AssociationFilter OperationArguments::filter() const {
+    return {className("AssocClass"), className("ResultClass"), string("Role"), string("ResultRole")};
+}
+
+const XmlElement& OperationArguments::required(std::string_view name) const {
+    const XmlElement* element = message.find(name);
+    if (element == nullptr) {
+        invalid(name, "is missing");
+    }
+    return *element;
+}
+
+}  // namespace cimhost::cimxml

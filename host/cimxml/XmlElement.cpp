@@ -1,0 +1,147 @@
+#include "cimxml/XmlElement.h"
+
+#include <libxml/SAX2.h>
+#include <libxml/parser.h>
+
+#include <algorithm>
+#include <limits>
+#include <memory>
+#include <optional>
+
+namespace cimhost::cimxml {
+namespace {
+
+std::string stringOf(const xmlChar* characters) {
+    return reinterpret_cast<const char*>(characters);
+}
+
+/** Builds the tree from the events of libxml2's parser. */
+class TreeBuilder {
+public:
+    explicit TreeBuilder(const XmlLimits& itsLimits) : limits(itsLimits) {}
+
+    XmlElement build(std::string_view document) {
+        static const bool isInitialized = (xmlInitParser(), true);
+        static_cast<void>(isInitialized);
+        if (document.size() > static_cast<std::size_t>(std::numeric_limits<int>::max())) {
+            throw XmlError("the document is too large");
+        }
+        xmlSAXHandler events = handler();
+        const std::unique_ptr<xmlParserCtxt, decltype(&xmlFreeParserCtxt)> context(
+            xmlCreatePushParserCtxt(&events, this, nullptr, 0, nullptr), &xmlFreeParserCtxt);
+        if (context == nullptr) {
+            throw std::bad_alloc();
+        }
+        parser = context.get();
+        // Without XML_PARSE_NOENT, ampersands of attributes would remain encoded. There are no entities to declare.
+        xmlCtxtUseOptions(parser, XML_PARSE_NONET | XML_PARSE_NOENT);
+        const int result = xmlParseChunk(parser, document.data(), static_cast<int>(document.size()), 1);
+        if (refusal) {
+            throw XmlError(*refusal + " (line " + std::to_string(refusedLine) + ")");
+        }
+        if (result != XML_ERR_OK || !hasRoot) {
+            throw XmlError(parserMessage());
+        }
+        return std::move(root);
+    }
+
+private:
+    static TreeBuilder& of(void* builder) { return *static_cast<TreeBuilder*>(builder); }
+
+    static xmlSAXHandler handler() {
+        xmlSAXHandler events{};
+        events.startElement = [](void* self, const xmlChar* name, const xmlChar** attributes) {
+            of(self).guarded([&] { of(self).start(name, attributes); });
+        };
+        events.endElement = [](void* self, const xmlChar*) { of(self).open.pop_back(); };
+        events.characters = [](void* self, const xmlChar* characters, int size) {
+            of(self).guarded([&] { of(self).append(characters, size); });
+        };
+        events.ignorableWhitespace = events.characters;
+        events.cdataBlock = events.characters;
+        events.internalSubset = [](void* self, const xmlChar*, const xmlChar*, const xmlChar*) {
+            of(self).refuse("a document type declaration is not permitted");
+        };
+        events.getEntity = [](void*, const xmlChar* name) { return xmlGetPredefinedEntity(name); };
+        return events;
+    }
+
+    /** Runs an action; exceptions must not pass through the parser, which is written in C. */
+    template <class Action>
+    void guarded(Action&& action) {
+        try {
+            action();
+        } catch (const std::exception& error) {
+            refuse(error.what());
+        }
+    }
+
+    void start(const xmlChar* name, const xmlChar** attributes) {
+        if (open.size() >= limits.depth) {
+            return refuse("elements are nested deeper than " + std::to_string(limits.depth));
+        }
+        if (++count > limits.elements) {
+            return refuse("there are more than " + std::to_string(limits.elements) + " elements");
+        }
+        XmlElement& element = open.empty() ? root : open.back()->children.emplace_back();
+        hasRoot = true;
+        element.name = stringOf(name);
+        for (const xmlChar** each = attributes; each != nullptr && *each != nullptr; each += 2) {
+            element.attributes.emplace_back(stringOf(each[0]), each[1] == nullptr ? "" : stringOf(each[1]));
+        }
+        open.push_back(&element);
+    }
+
+    void append(const xmlChar* characters, int size) {
+        if (!open.empty()) {
+            open.back()->characters.append(reinterpret_cast<const char*>(characters), static_cast<std::size_t>(size));
+        }
+    }
+
+    void refuse(const std::string& reason) {
+        if (!refusal) {
+            refusal = reason;
+            refusedLine = xmlSAX2GetLineNumber(parser);
+        }
+        xmlStopParser(parser);
+    }
+
+    std::string parserMessage() const {
+        const xmlError* error = xmlCtxtGetLastError(parser);
+        if (error == nullptr || error->message == nullptr) {
+            return "the document has no element";
+        }
+        std::string message = error->message;
+        message.erase(message.find_last_not_of('\n') + 1);
+        return message + " (line " + std::to_string(error->line) + ")";
+    }
+
+    const XmlLimits& limits;
+    xmlParserCtxt* parser = nullptr;
+    XmlElement root;
+    bool hasRoot = false;
+    std::vector<XmlElement*> open;  ///< from the root to the element that is being read
+    std::size_t count = 0;
+    std::optional<std::string> refusal;
+    int refusedLine = 0;
+};
+
+}  // namespace
+
+const std::string* XmlElement::attribute(std::string_view attributeName) const {
+    const auto found = std::find_if(attributes.begin(), attributes.end(),
+                                    [&](const auto& each) { return each.first == attributeName; });
+    return found == attributes.end() ? nullptr : &found->second;
+}
+
+const XmlElement* XmlElement::child(std::string_view childName) const {
+    const auto found =
+        std::find_if(children.begin(), children.end(), [&](const auto& each) { return each.name == childName; });
+    return found == children.end() ? nullptr : &*found;
+}
+
+XmlElement parseXml(std::string_view document, const XmlLimits& limits) {
+    return TreeBuilder(limits).build(document);
+}
+
+}  // namespace cimhost::cimxml

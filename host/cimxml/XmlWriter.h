@@ -1,0 +1,57 @@
+#pragma once
+
+#include <string>
+#include <string_view>
+
+namespace cimhost::cimxml {
+
+/**
+ * Appends a string as character data or attribute value. Escapes with the five predefined entities only, since some
+ * clients understand no others.
+ */
+void appendEscaped(std::string& xml, std::string_view characters);
+
+/** Appends NAME="value" with a blank before it. */
+void appendAttribute(std::string& xml, std::string_view name, std::string_view value);
+
+/** Whether XML 1.0 can represent a string: valid UTF-8 without control characters except tab and line ends. */
+bool isRepresentable(std::string_view characters);
+
+/** Replaces what XML 1.0 cannot represent by U+FFFD. */
+std::string representable(std::string_view characters);
+
+/**
+ * An element: writes the start tag, and the end tag when it is destroyed. Elements are never self-closed, since some
+ * clients do not understand that.
+ */
+class Element {
+public:
+    /** @param itsName a literal: only the reference is kept */
+    Element(std::string& itsXml, std::string_view itsName) : xml(itsXml), name(itsName) {
+        xml += '<';
+        xml += name;
+        xml += '>';
+    }
+
+    /** An element with attributes, which a function appends. */
+    template <class Attributes>
+    Element(std::string& itsXml, std::string_view itsName, Attributes&& attributes) : xml(itsXml), name(itsName) {
+        xml += '<';
+        xml += name;
+        attributes();
+        xml += '>';
+    }
+    ~Element() {
+        xml += "</";
+        xml += name;
+        xml += '>';
+    }
+    Element(const Element&) = delete;
+    Element& operator=(const Element&) = delete;
+
+private:
+    std::string& xml;
+    std::string_view name;
+};
+
+}  // namespace cimhost::cimxml

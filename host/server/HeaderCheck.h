@@ -1,0 +1,40 @@
+#pragma once
+
+#include <optional>
+#include <string>
+#include <variant>
+
+#include "cimxml/Message.h"
+#include "server/HttpRequest.h"
+
+namespace cimhost::server {
+
+/** The headers of a CIM operation request that has passed the check. */
+struct CimHeaders {
+    std::string method{};           ///< CIMMethod
+    std::string object{};           ///< CIMObject, decoded
+    std::string extensionPrefix{};  ///< "NN-" for M-POST, else empty
+};
+
+/** The conditions that depend on the listener. */
+struct HeaderRules {
+    bool requiresLocalHost = false;  ///< the header Host must name this machine's loopback interface
+    std::size_t largestBody = 0;
+};
+
+/** Checks the head of a request. @return the headers of the operation, or the response that ends the request */
+std::variant<CimHeaders, HttpResponse> checkHeaders(const HttpRequest& request, const HeaderRules& rules);
+
+/** Whether a body agrees with the headers. @return the response that refuses it, or none */
+std::optional<HttpResponse> checkAgreement(const CimHeaders& headers, const cimxml::Message& message);
+
+/** A response to a request that is refused. @param cimError value of the header CIMError; empty: none */
+HttpResponse refusal(unsigned status, const std::string& why, const std::string& cimError = {});
+
+/** The response to a request with a larger body than permitted. */
+HttpResponse tooLarge(std::size_t largest);
+
+/** Decodes %XX; none if a percent sign has no two hexadecimal digits after it. */
+std::optional<std::string> percentDecoded(const std::string& encoded);
+
+}  // namespace cimhost::server

@@ -1,0 +1,156 @@
+#include "server/RequestHandler.h"
+
+#include <thread>
+
+#include "cimxml/Errors.h"
+
+namespace cimhost::server {
+namespace {
+
+constexpr std::chrono::seconds authorizationLifetime{60};
+constexpr std::size_t patience = 4;  ///< multiple of the largest request that is received although it is refused
+
+HttpResponse unauthorized() {
+    HttpResponse response = refusal(401, "Send the name and password of a user who may use this server.");
+    response.headers.emplace("WWW-Authenticate", "Basic realm=\"cimhost\", charset=\"UTF-8\"");
+    return response;
+}
+
+HttpResponse unavailable(const std::string& why) {
+    HttpResponse response = refusal(503, why);
+    response.headers.emplace("Retry-After", "5");
+    return response;
+}
+
+}  // namespace
+
+RequestHandler::RequestHandler(const Settings& itsSettings, cimxml::Operations& itsOperations,
+                               Authenticator& itsAuthenticator, const AccessLog& itsLog)
+    : settings(itsSettings),
+      operations(itsOperations),
+      authenticator(itsAuthenticator),
+      accessLog(itsLog),
+      slots(itsSettings.limits.requestsAtWork) {}
+
+/**
+ * A client that is still sending may lose a response that it receives before it has sent the body, since the connection
+ * ends. So the response waits, unless the client itself waits or would send many times too much.
+ */
+std::optional<HttpResponse> RequestHandler::begin(Exchange& exchange, const HttpRequest& request) {
+    exchange.refused = check(exchange, request);
+    const std::string length = headerIn(request.headers, "Content-Length").value_or("");
+    const bool isShort = !length.empty() && length.size() < 10 && length.find_first_not_of("0123456789") == length.npos;
+    const bool isAwaited = isShort && std::stoul(length) <= patience * settings.limits.requestBytes &&
+                           request.headers.count("Expect") == 0 && request.headers.count("Transfer-Encoding") == 0;
+    return isAwaited ? std::nullopt : exchange.refused;
+}
+
+std::optional<HttpResponse> RequestHandler::check(Exchange& exchange, const HttpRequest& request) {
+    if (stopping) {
+        return unavailable("The server is stopping.");
+    }
+    auto checked = checkHeaders(request, exchange.rules);
+    if (auto* response = std::get_if<HttpResponse>(&checked)) {
+        return std::move(*response);
+    }
+    exchange.headers = std::get<CimHeaders>(std::move(checked));
+    exchange.record.operation = exchange.headers.method;
+    return exchange.needsAuthentication ? authenticate(exchange, request) : std::nullopt;
+}
+
+std::optional<HttpResponse> RequestHandler::authenticate(Exchange& exchange, const HttpRequest& request) {
+    const auto authorization = headerIn(request.headers, "Authorization");
+    const auto credentials = authorization ? credentialsFrom(*authorization) : std::nullopt;
+    if (!credentials) {
+        return unauthorized();
+    }
+    exchange.record.user = credentials->user;
+    const Right right = verified(exchange, *authorization);
+    if (right == Right::none) {
+        std::this_thread::sleep_for(settings.limits.failureDelay);
+        return unauthorized();
+    }
+    exchange.caller = {credentials->user, right == Right::write};
+    return std::nullopt;
+}
+
+/** Passwords are checked once per connection and minute, since PAM modules take long. */
+Right RequestHandler::verified(Exchange& exchange, const std::string& authorization) {
+    const Credentials credentials = *credentialsFrom(authorization);
+    const auto now = std::chrono::steady_clock::now();
+    Connection& connection = *exchange.connection;
+    const bool isKnown = connection.authorization == authorization && now < connection.authorizedUntil;
+    if (!isKnown && !authenticator.accepts(credentials)) {
+        return Right::none;
+    }
+    if (!isKnown) {
+        connection.authorization = authorization;
+        connection.authorizedUntil = now + authorizationLifetime;
+    }
+    return rightOf(credentials.user, settings.access);
+}
+
+bool RequestHandler::receive(Exchange& exchange, const char* data, std::size_t size) const {
+    if (!exchange.refused && exchange.body.size() + size > settings.limits.requestBytes) {
+        exchange.refused = tooLarge(settings.limits.requestBytes);
+        exchange.body = {};
+    }
+    if (!exchange.refused) {
+        exchange.body.append(data, size);
+        return true;
+    }
+    exchange.ignored += size;
+    return exchange.ignored <= patience * settings.limits.requestBytes;
+}
+
+Reply RequestHandler::finish(Exchange& exchange) {
+    if (exchange.refused) {
+        return *exchange.refused;
+    }
+    exchange.connection->enter(Connection::Phase::work);
+    const RequestSlots::Held slot(slots, settings.limits.queueTime);
+    if (!slot) {
+        return unavailable("The server has too many requests.");
+    }
+    try {
+        return perform(exchange);
+    } catch (const cimxml::RequestRefused& refused) {
+        return refusal(refused.httpStatus, refused.what(), refused.cimError);
+    }
+}
+
+Reply RequestHandler::perform(Exchange& exchange) {
+    cimxml::XmlLimits limits;
+    limits.depth = settings.limits.xmlDepth;
+    const cimxml::Message message = cimxml::readMessage(exchange.body, limits);
+    exchange.body = {};
+    if (auto disagreement = checkAgreement(exchange.headers, message)) {
+        return *disagreement;
+    }
+    exchange.record.className = cimxml::Operations::subjectOf(message);
+    const auto failed = [&](const cimxml::CimError& error) {
+        exchange.record.cimStatus = error.code;
+        return std::make_shared<cimxml::ResponseText>(message, error);
+    };
+    try {
+        auto text = std::make_shared<cimxml::ResponseText>(message, operations.perform(message, exchange.caller));
+        exchange.record.objects = text->count();
+        return text;
+    } catch (const cimxml::RequestRefused&) {
+        throw;
+    } catch (const cimxml::CimError& error) {
+        return failed(error);
+    } catch (const std::exception& error) {
+        return failed({CMPI_RC_ERR_FAILED, error.what()});
+    }
+}
+
+void RequestHandler::log(Exchange& exchange, unsigned httpStatus) const {
+    exchange.record.client = exchange.client;
+    exchange.record.httpStatus = httpStatus;
+    exchange.record.duration =
+        std::chrono::duration_cast<std::chrono::microseconds>(std::chrono::steady_clock::now() - exchange.start);
+    accessLog.write(exchange.record);
+}
+
+}  // namespace cimhost::server

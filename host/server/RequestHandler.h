@@ -1,0 +1,78 @@
+#pragma once
+
+#include <atomic>
+#include <chrono>
+#include <memory>
+#include <optional>
+#include <string>
+#include <variant>
+
+#include "cimxml/Operations.h"
+#include "cimxml/ResponseText.h"
+#include "server/AccessLog.h"
+#include "server/Authentication.h"
+#include "server/ConnectionTable.h"
+#include "server/HeaderCheck.h"
+#include "server/RequestSlots.h"
+#include "server/Settings.h"
+
+namespace cimhost::server {
+
+/** One HTTP request and its response, from its head to the end of its response. */
+struct Exchange {
+    HeaderRules rules{};
+    std::string client{};  ///< its address and port
+    Connection* connection = nullptr;
+    bool needsAuthentication = true;
+    CimHeaders headers{};  ///< of a request that has passed the checks
+    cimxml::Caller caller{};
+    std::string body{};
+    std::optional<HttpResponse> refused{};  ///< the response, once the body, which is ignored, has arrived
+    std::size_t ignored = 0;                ///< bytes of the body
+    AccessRecord record{};
+    std::chrono::steady_clock::time_point start = std::chrono::steady_clock::now();
+};
+
+/** The text of a CIM response, or an HTTP response without one. */
+using Reply = std::variant<HttpResponse, std::shared_ptr<cimxml::ResponseText>>;
+
+/** Checks, authenticates and performs requests. Called concurrently. */
+class RequestHandler {
+public:
+    RequestHandler(const Settings& itsSettings, cimxml::Operations& itsOperations, Authenticator& itsAuthenticator,
+                   const AccessLog& itsLog);
+
+    /** Decides on the head of a request. @return the response that ends it, or none to receive its body */
+    std::optional<HttpResponse> begin(Exchange& exchange, const HttpRequest& request);
+
+    /** Appends a part of the body. @return false if the client sends so much that the connection must end */
+    bool receive(Exchange& exchange, const char* data, std::size_t size) const;
+
+    /** Performs the complete request. */
+    Reply finish(Exchange& exchange);
+
+    /** Writes the access log line. */
+    void log(Exchange& exchange, unsigned httpStatus) const;
+
+    /** Ends open enumerations whose timeout has passed. */
+    void removeExpired() { operations.removeExpired(); }
+
+    /** From now on, requests are answered with 503. */
+    void stop() { stopping = true; }
+    bool isStopping() const { return stopping; }
+
+private:
+    std::optional<HttpResponse> check(Exchange& exchange, const HttpRequest& request);
+    std::optional<HttpResponse> authenticate(Exchange& exchange, const HttpRequest& request);
+    Right verified(Exchange& exchange, const std::string& authorization);
+    Reply perform(Exchange& exchange);
+
+    const Settings& settings;
+    cimxml::Operations& operations;
+    Authenticator& authenticator;
+    const AccessLog& accessLog;
+    RequestSlots slots;
+    std::atomic<bool> stopping{false};
+};
+
+}  // namespace cimhost::server

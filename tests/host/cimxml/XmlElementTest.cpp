@@ -1,0 +1,93 @@
+#include "cimxml/XmlElement.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "cimxml/XmlWriter.h"
+
+using namespace cimhost::cimxml;
+using testing::HasSubstr;
+
+namespace {
+
+std::string reasonFor(const std::string& document, const XmlLimits& limits = {}) {
+    try {
+        parseXml(document, limits);
+    } catch (const XmlError& error) {
+        return error.what();
+    }
+    return "accepted";
+}
+
+TEST(XmlElementTest, ElementsHaveAttributesChildrenAndCharacters) {
+    const XmlElement root =
+        parseXml("<?xml version=\"1.0\"?><A X=\"1&amp;2\"><B>b</B><C/><B>c&#65;<![CDATA[<d>]]></B></A>");
+    EXPECT_EQ(root.name, "A");
+    EXPECT_EQ(*root.attribute("X"), "1&2");
+    EXPECT_EQ(root.attribute("Y"), nullptr);
+    ASSERT_EQ(root.children.size(), 3U);
+    EXPECT_EQ(root.child("B")->characters, "b");
+    EXPECT_EQ(root.children[2].characters, "cA<d>");
+    EXPECT_EQ(root.child("D"), nullptr);
+}
+
+TEST(XmlElementTest, CharactersOfOtherEncodingsBecomeUtf8) {
+    EXPECT_EQ(parseXml("<?xml version=\"1.0\" encoding=\"ISO-8859-1\"?><A>\xE4</A>").characters, "\xC3\xA4");
+}
+
+TEST(XmlElementTest, MalformedDocumentsAreRefusedWithTheLine) {
+    EXPECT_THAT(reasonFor("<A>\n<B></A>"), HasSubstr("line 2"));
+    for (const char* document : {"", " ", "A", "<A>", "<A/><B/>", "<A X='1' X='2'/>", "<A>\x01</A>", "<A>\xFF</A>",
+                                 "<A>&undefined;</A>", "<A>&#0;</A>", "<A/>rest"}) {
+        EXPECT_NE(reasonFor(document), "accepted") << document;
+    }
+}
+
+TEST(XmlElementTest, DocumentTypesAreRefusedBeforeTheirEntitiesAreRead) {
+    EXPECT_THAT(reasonFor("<!DOCTYPE A [<!ENTITY a \"aaaa\"><!ENTITY b \"&a;&a;\">]><A>&b;</A>"),
+                HasSubstr("document type declaration"));
+    EXPECT_THAT(reasonFor("<!DOCTYPE A SYSTEM \"file:///etc/passwd\"><A/>"), HasSubstr("document type declaration"));
+}
+
+TEST(XmlElementTest, DepthAndNumberOfElementsAreLimited) {
+    const auto nested = [](std::size_t depth) {
+        std::string document;
+        for (std::size_t i = 0; i < depth; ++i) {
+            document += "<A>";
+        }
+        for (std::size_t i = 0; i < depth; ++i) {
+            document += "</A>";
+        }
+        return document;
+    };
+    EXPECT_EQ(reasonFor(nested(5), {5, 100}), "accepted");
+    EXPECT_THAT(reasonFor(nested(6), {5, 100}), HasSubstr("nested deeper than 5"));
+    EXPECT_THAT(reasonFor(nested(100'000)), HasSubstr("nested deeper"));
+    EXPECT_EQ(reasonFor("<A><B/><B/></A>", {5, 3}), "accepted");
+    EXPECT_THAT(reasonFor("<A><B/><B/><B/></A>", {5, 3}), HasSubstr("more than 3 elements"));
+}
+
+TEST(XmlWriterTest, EscapesWithNamedEntitiesOnly) {
+    std::string xml;
+    appendEscaped(xml, "a<b>&\"c'\n\xC3\xA4");
+    EXPECT_EQ(xml, "a&lt;b&gt;&amp;&quot;c&apos;\n\xC3\xA4");
+}
+
+TEST(XmlWriterTest, KnowsWhatXmlCanRepresent) {
+    EXPECT_TRUE(isRepresentable("a\t\r\n\xC3\xA4\xF0\x9F\x98\x80"));
+    for (const char* string : {"\x01", "a\x1F", "\xFF", "\xC3", "\xEF\xBF\xBF", "\xED\xA0\x80"}) {
+        EXPECT_FALSE(isRepresentable(string)) << string;
+        EXPECT_TRUE(isRepresentable(representable(string))) << string;
+    }
+    EXPECT_EQ(representable("a\x01z"), "a\xEF\xBF\xBDz");
+}
+
+TEST(XmlWriterTest, ElementsAreNeverSelfClosed) {
+    std::string xml;
+    {
+        const Element element(xml, "A", [&] { appendAttribute(xml, "X", "<1>"); });
+    }
+    EXPECT_EQ(xml, "<A X=\"&lt;1&gt;\"></A>");
+}
+
+}  // namespace

@@ -1,0 +1,82 @@
+#include "server/Authentication.h"
+
+#include <gmock/gmock.h>
+#include <grp.h>
+#include <gtest/gtest.h>
+#include <pwd.h>
+#include <unistd.h>
+
+#include <filesystem>
+#include <fstream>
+
+#include "support/Files.h"
+
+using namespace cimhost::server;
+
+namespace {
+
+TEST(CredentialsTest, AreReadFromTheBasicScheme) {
+    const auto found = credentialsFrom("Basic dXNlcjpwYTpzcw==");  // user:pa:ss
+    ASSERT_TRUE(found);
+    EXPECT_EQ(found->user, "user");
+    EXPECT_EQ(found->password, "pa:ss");
+    EXPECT_TRUE(credentialsFrom("basic  dTo="));  // u:
+}
+
+TEST(CredentialsTest, OtherValuesAreRefused) {
+    for (const char* value : {"", "Basic", "Basic ", "Bearer dXNlcjpwYTpzcw==", "Basic dXNlcg==", "Basic OnBhc3M=",
+                              "Basic dXNlcjpwYTpzcw=", "Basic dXNl*jpwYTpzcw==", "Basic ====", "Basic dTpwAHg="}) {
+        EXPECT_FALSE(credentialsFrom(value)) << value;
+    }
+}
+
+/** A PAM service that asks a program, which accepts one user with one password. */
+class PamTest : public testing::Test {
+protected:
+    PamTest() {
+        const std::string program = directory.withSlash() + "check";
+        std::ofstream(program) << "#!/bin/sh\nread -r password\n"
+                                  "[ \"$PAM_USER\" = alice ] && [ \"$password\" = \"right one\" ]\n";
+        std::filesystem::permissions(program, std::filesystem::perms::owner_all);
+        std::ofstream(directory.withSlash() + "test-service")
+            << "auth required pam_exec.so expose_authtok quiet " << program << "\naccount required pam_permit.so\n";
+        std::ofstream(directory.withSlash() + "no-account")
+            << "auth required pam_permit.so\naccount required pam_deny.so\n";
+    }
+
+    testsupport::TempDirectory directory;
+};
+
+TEST_F(PamTest, TheServiceDecides) {
+    PamAuthenticator authenticator("test-service", directory.path());
+    EXPECT_TRUE(authenticator.accepts({"alice", "right one"}));
+    EXPECT_FALSE(authenticator.accepts({"alice", "wrong"}));
+    EXPECT_FALSE(authenticator.accepts({"bob", "right one"}));
+    EXPECT_FALSE(authenticator.accepts({"alice", ""}));
+}
+
+TEST_F(PamTest, AccountsMustBeValid) {
+    EXPECT_FALSE(PamAuthenticator("no-account", directory.path()).accepts({"alice", "right one"}));
+}
+
+TEST(AccessRulesTest, UsersAndGroupsHaveRights) {
+    EXPECT_EQ(rightOf("root", AccessRules{}), Right::write);
+    EXPECT_EQ(rightOf("alice", AccessRules{}), Right::none);
+    const AccessRules rules{{"alice", "bob"}, {"bob"}};
+    EXPECT_EQ(rightOf("alice", rules), Right::read);
+    EXPECT_EQ(rightOf("bob", rules), Right::write);
+    EXPECT_EQ(rightOf("root", rules), Right::none);
+}
+
+TEST(AccessRulesTest, AGroupGivesItsMembersTheRight) {
+    const passwd* user = ::getpwuid(::getuid());
+    ASSERT_NE(user, nullptr);
+    const group* ownGroup = ::getgrgid(user->pw_gid);
+    ASSERT_NE(ownGroup, nullptr);
+    const AccessRules rules{{std::string("@") + ownGroup->gr_name}, {"@no-such-group"}};
+    EXPECT_EQ(rightOf(user->pw_name, rules), Right::read);
+    EXPECT_EQ(rightOf("no-such-user", rules), Right::none);
+    EXPECT_EQ(rightOf(std::string("@") + ownGroup->gr_name, {}), Right::none);
+}
+
+}  // namespace

@@ -1,0 +1,161 @@
+#include "server/HeaderCheck.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+using namespace cimhost::server;
+
+namespace {
+
+class HeaderCheckTest : public testing::Test {
+public:
+    /** Changes a header; an empty value removes it. */
+    HeaderCheckTest& with(const std::string& name, const std::string& value) {
+        request.headers.erase(name);
+        if (!value.empty()) {
+            request.headers.emplace(name, value);
+        }
+        return *this;
+    }
+
+    std::variant<CimHeaders, HttpResponse> check() const { return checkHeaders(request, rules); }
+
+    /** The HTTP status, with the CIMError; 200 for a request that is accepted. */
+    std::string result() const {
+        const auto checked = check();
+        const auto* response = std::get_if<HttpResponse>(&checked);
+        if (response == nullptr) {
+            return "200";
+        }
+        const auto error = headerIn(response->headers, "CIMError");
+        return std::to_string(response->status) + (error ? " " + *error : "");
+    }
+
+    HttpRequest request{"POST",
+                        {{"Host", "localhost:5988"},
+                         {"Content-Type", "application/xml; charset=\"utf-8\""},
+                         {"Content-Length", "100"},
+                         {"CIMOperation", "MethodCall"},
+                         {"CIMMethod", "GetClass"},
+                         {"CIMObject", "root%2Fcimv2"}}};
+    HeaderRules rules{true, 1000};
+};
+
+TEST_F(HeaderCheckTest, AcceptsARequestAndDecodesItsHeaders) {
+    const auto checked = check();
+    ASSERT_TRUE(std::holds_alternative<CimHeaders>(checked));
+    EXPECT_EQ(std::get<CimHeaders>(checked).object, "root/cimv2");
+    EXPECT_EQ(std::get<CimHeaders>(checked).method, "GetClass");
+}
+
+TEST_F(HeaderCheckTest, OtherMethodsAreNotAllowed) {
+    for (const char* method : {"GET", "DELETE", "PUT", "HEAD", "TRACE", "NONSENSE"}) {
+        request.method = method;
+        const auto checked = check();
+        const auto& response = std::get<HttpResponse>(checked);
+        EXPECT_EQ(response.status, 405U) << method;
+        EXPECT_EQ(headerIn(response.headers, "Allow"), "POST, M-POST, OPTIONS");
+    }
+}
+
+TEST_F(HeaderCheckTest, OptionsReportTheProtocol) {
+    request.method = "OPTIONS";
+    const auto checked = check();
+    const auto& response = std::get<HttpResponse>(checked);
+    EXPECT_EQ(response.status, 200U);
+    EXPECT_EQ(headerIn(response.headers, "CIMProtocolVersion"), "1.0");
+    EXPECT_TRUE(headerIn(response.headers, "CIMSupportedFunctionalGroups"));
+}
+
+TEST_F(HeaderCheckTest, WebPagesReceiveNoAnswer) {
+    EXPECT_EQ(with("CIMOperation", "").result(), "400");
+    with("CIMOperation", "MethodCall");
+    EXPECT_EQ(with("Origin", "http://evil.example").result(), "403");
+    request.method = "OPTIONS";
+    EXPECT_EQ(result(), "403");
+}
+
+TEST_F(HeaderCheckTest, OnlyNamesOfTheLoopbackInterfaceAreHostsWithoutAuthentication) {
+    for (const char* host : {"localhost", "LOCALHOST:1", "127.0.0.1", "127.1.2.3:5988", "[::1]", "[::1]:5988"}) {
+        EXPECT_EQ(with("Host", host).result(), "200") << host;
+    }
+    for (const char* host : {"", "evil.example", "localhost.evil.example", "127.0.0.1.evil.example", "10.0.0.1"}) {
+        EXPECT_EQ(with("Host", host).result(), "403") << host;
+    }
+    rules.requiresLocalHost = false;
+    EXPECT_EQ(with("Host", "server.example").result(), "200");
+}
+
+TEST_F(HeaderCheckTest, HeadersOfTheOperationMustBeThere) {
+    EXPECT_EQ(with("CIMOperation", "MethodResponse").result(), "400");
+    EXPECT_EQ(with("CIMOperation", "methodcall").result(), "200");
+    EXPECT_EQ(with("CIMMethod", "").result(), "400 header-mismatch");
+    EXPECT_EQ(with("CIMMethod", "GetClass").with("CIMObject", "").result(), "400 header-mismatch");
+    EXPECT_EQ(with("CIMObject", "root%2").result(), "400 header-mismatch");
+    EXPECT_EQ(with("CIMObject", "root%zz").result(), "400 header-mismatch");
+    with("CIMObject", "root");
+    request.headers.emplace("CIMObject", "interop");
+    EXPECT_EQ(result(), "400 header-mismatch");
+}
+
+TEST_F(HeaderCheckTest, ProtocolVersionsAndGroupsOfTheFutureAreRefused) {
+    EXPECT_EQ(with("CIMProtocolVersion", "1.4").result(), "200");
+    EXPECT_EQ(with("CIMProtocolVersion", "2.0").result(), "400 unsupported-protocol-version");
+    EXPECT_EQ(with("CIMProtocolVersion", "1.0").with("CIMBatch", "x").result(), "501 multiple-requests-unsupported");
+    EXPECT_EQ(with("CIMBatch", "").with("CIMExport", "x").result(), "501 unsupported-operation");
+}
+
+TEST_F(HeaderCheckTest, OnlyXmlInUtf8IsAccepted) {
+    for (const char* type : {"text/xml", "application/xml", "TEXT/XML; charset=UTF-8", "text/xml;charset=utf-8"}) {
+        EXPECT_EQ(with("Content-Type", type).result(), "200") << type;
+    }
+    for (const char* type : {"", "application/json", "text/xml; charset=utf-16", "text/xmlx"}) {
+        EXPECT_EQ(with("Content-Type", type).result(), "415") << type;
+    }
+    EXPECT_EQ(with("Content-Type", "text/xml").with("Content-Encoding", "gzip").result(), "415");
+}
+
+TEST_F(HeaderCheckTest, TheLengthIsLimitedAndUnambiguous) {
+    EXPECT_EQ(with("Content-Length", "1000").result(), "200");
+    EXPECT_EQ(with("Content-Length", "1001").result(), "413");
+    EXPECT_EQ(with("Content-Length", "99999999999999999999999").result(), "413");
+    EXPECT_EQ(with("Content-Length", "-1").result(), "400");
+    EXPECT_EQ(with("Content-Length", "5").with("Transfer-Encoding", "chunked").result(), "400");
+    EXPECT_EQ(with("Content-Length", "").result(), "200");
+    with("Transfer-Encoding", "").with("Content-Length", "5");
+    request.headers.emplace("Content-Length", "6");
+    EXPECT_EQ(result(), "400");
+}
+
+TEST_F(HeaderCheckTest, ExtensionRequestsHavePrefixedHeaders) {
+    request.method = "M-POST";
+    EXPECT_EQ(result(), "510");
+    with("Man", "http://www.dmtf.org/cim/mapping/http/v1.0 ; ns=73");
+    EXPECT_EQ(result(), "400");
+    with("73-CIMOperation", "MethodCall").with("73-CIMMethod", "GetClass").with("73-CIMObject", "root");
+    const auto checked = check();
+    ASSERT_TRUE(std::holds_alternative<CimHeaders>(checked));
+    EXPECT_EQ(std::get<CimHeaders>(checked).extensionPrefix, "73-");
+    EXPECT_EQ(std::get<CimHeaders>(checked).object, "root");
+    EXPECT_EQ(with("Man", "http://example.com/other ; ns=73").result(), "510");
+}
+
+TEST(HeaderAgreementTest, HeadersMustAgreeWithTheBody) {
+    cimhost::cimxml::Message message;
+    message.method = "GetClass";
+    message.object = "root/cimv2";
+    const auto agrees = [&](const std::string& method, const std::string& object) {
+        return !checkAgreement({method, object, ""}, message);
+    };
+    EXPECT_TRUE(agrees("GetClass", "root/cimv2"));
+    EXPECT_TRUE(agrees("getclass", "ROOT/cimv2"));
+    EXPECT_TRUE(agrees("GetClass", "/root/cimv2"));
+    EXPECT_FALSE(agrees("GetInstance", "root/cimv2"));
+    EXPECT_FALSE(agrees("GetClass", "root"));
+    message.isIntrinsic = false;
+    message.object = "root/cimv2:Base";
+    EXPECT_TRUE(agrees("GetClass", "root/cimv2:Base.Name=\"a\""));
+    EXPECT_FALSE(agrees("GetClass", "root/cimv2:Other"));
+}
+
+}  // namespace
