@@ -3,6 +3,7 @@
 #include "LeaseBase.h"
 #include "RecordStream.h"
 #include "WarrantyBase.h"
+#include "cim/DateTime.h"
 #include "cim/Utf8.h"
 
 #include <algorithm>
@@ -60,7 +61,7 @@ std::string hexadecimal(const std::string& bytes) {
 }
 
 Document jsonOf(const std::string& value, store::TextForm form) {
-    if (form == store::TextForm::date && value == store::defaultDate) {
+    if (form == store::TextForm::date && value == cim::noDate) {
         return nullptr;
     }
     const bool isUtf8 = cim::findInvalidUtf8(value) == std::string::npos;
@@ -98,7 +99,7 @@ void assign(std::string& target, const Document& value, store::TextForm form) {
     const bool isNull = form == store::TextForm::date && value.is_null();
     require(isNull || value.is_string() || value.is_object(),
             form == store::TextForm::date ? "must be a string or null" : "must be a string");
-    target = isNull ? store::defaultDate : value.is_object() ? bytesOf(value) : value.get<std::string>();
+    target = isNull ? std::string(cim::noDate) : value.is_object() ? bytesOf(value) : value.get<std::string>();
 }
 
 void assign(unsigned int& target, const Document& value, store::TextForm) {

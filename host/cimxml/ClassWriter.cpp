@@ -4,7 +4,7 @@
 
 #include "cim/Names.h"
 #include "cimxml/XmlWriter.h"
-#include "schema/CimType.h"
+#include "model/Value.h"
 
 namespace cimhost::cimxml {
 namespace {

@@ -8,7 +8,7 @@
 #include "cim/Names.h"
 #include "cimxml/Errors.h"
 #include "cimxml/Message.h"
-#include "schema/CimType.h"
+#include "model/Value.h"
 #include "schema/Errors.h"
 #include "schema/Literal.h"
 #include "schema/StringLiteral.h"

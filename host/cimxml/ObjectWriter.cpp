@@ -10,7 +10,7 @@
 #include "cim/Utf8.h"
 #include "cimxml/Errors.h"
 #include "cimxml/XmlWriter.h"
-#include "schema/CimType.h"
+#include "model/Value.h"
 
 namespace cimhost::cimxml {
 namespace {

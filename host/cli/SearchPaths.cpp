@@ -7,7 +7,7 @@
 #include <system_error>
 
 #include "Installation.h"
-#include "cli/ExitStatus.h"
+#include "cli/Arguments.h"
 #include "schema/Errors.h"
 
 namespace cimhost {

@@ -10,7 +10,7 @@
 #include <cstdio>
 
 #include "Installation.h"
-#include "cli/ExitStatus.h"
+#include "cli/Arguments.h"
 #include "schema/Errors.h"
 #include "server/Service.h"
 
