@@ -109,8 +109,8 @@ TEST(SecureProcess, IgnoresTheCallersPathsOfObjectManagerFiles) {
 
 /** cimhost is excluded: its command-line library could read variables, but none of its options uses one. */
 TEST(SecureProcess, ReadsVariablesOnlyWithSecureGetenv) {
-    std::istringstream libraries(SHIPPED_LIBRARIES);
-    for (std::string library; std::getline(libraries, library, ':');) {
+    std::istringstream shippedLibraries(SHIPPED_LIBRARIES);
+    for (std::string library; std::getline(shippedLibraries, library, ':');) {
         const std::string symbols = outputOf("nm --dynamic --undefined-only '" + library + "'");
         EXPECT_THAT(symbols, HasSubstr("@GLIBC")) << library << " was not read";
         EXPECT_THAT(symbols, Not(HasSubstr(" getenv"))) << library;
