@@ -53,7 +53,8 @@ constexpr std::array warrantyNames{identifier, "Warrantor", "WarrantyStartDate",
 std::string hexadecimal(const std::string& bytes) {
     constexpr const char* digits = "0123456789abcdef";
     std::string result;
-    for (const unsigned char byte : bytes) {
+    for (const char each : bytes) {
+        const auto byte = static_cast<unsigned char>(each);
         result += digits[byte >> 4U];
         result += digits[byte & 15U];
     }
