@@ -16,9 +16,8 @@ void ProviderLibrary::load() {
     handle = this;
 }
 
-bool ProviderLibrary::unload() {
+void ProviderLibrary::unload() {
     handle = nullptr;
-    return true;
 }
 
 CMPIInstanceMI* ProviderLibrary::createInstanceMI(const CMPIBroker* broker) const {

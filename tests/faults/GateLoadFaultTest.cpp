@@ -13,7 +13,7 @@
 namespace faults {
 namespace {
 
-constexpr int records = 4;
+constexpr int preparedRecords = 4;
 
 class GateLoadFaultTest : public testing::Test {
 protected:
@@ -22,7 +22,7 @@ protected:
     /** A lease file that a killed process has left, with its saved copy. */
     void restart() {
         FileContents files = environment.filesAtFirst();
-        const std::string complete = leaseRecords(records);
+        const std::string complete = leaseRecords(preparedRecords);
         files[leaseFile] = complete.substr(0, complete.size() / 2);
         files[std::string(leaseFile) + ".saved1"] = complete + "saved copy 1 of Lease.dat\n";
         environment.restart(files);
