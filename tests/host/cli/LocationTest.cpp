@@ -60,7 +60,7 @@ TEST(Location, AGateReplacesTheProviderOfItsClassesUnlessTheBareOneIsChosen) {
     EXPECT_THAT(list({"--provider", "bare"}, {}).output, Not(HasSubstr("Gate")));
     EXPECT_THAT(list({}, {"CIMHOST_PROVIDER=bare"}).output, Not(HasSubstr("Gate")));
     EXPECT_THAT(list({"--provider", "gate"}, {"CIMHOST_PROVIDER=bare"}).output, showsGate);
-    const Ended refused = list({}, {"CIMHOST_PROVIDER=other"});
+    const ProgramResult refused = list({}, {"CIMHOST_PROVIDER=other"});
     EXPECT_EQ(refused.status, 2);
     EXPECT_THAT(refused.error, HasSubstr("CIMHOST_PROVIDER is \"other\"; set it to gate or bare"));
 }
