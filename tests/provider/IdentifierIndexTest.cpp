@@ -1,7 +1,7 @@
 // Finding records by identifier.
 
 #include "IdentifierIndex.h"
-#include "LeaseUnit.h"
+#include "LeaseBase.h"
 
 #include <gtest/gtest.h>
 
