@@ -3,7 +3,6 @@
 #include "Dispatch.h"
 #include "KO/ProviderUtilities.h"
 #include "Trace.h"
-#include "cim/CmpiAccess.h"
 
 #include <exception>
 #include <string>
@@ -48,19 +47,20 @@ unsigned short classIdOf(const CallSite& site, Class requestedClass) {
     return classId;
 }
 
-/** Returns the namespace of a path; empty on failure. Writes the status that the entry point returns. */
+/**
+ * Returns the namespace of a path; empty on failure. The object manager writes the status that the entry point returns
+ * directly, since an exception may follow. ProviderUtilities::getNamespace returns no status.
+ */
 std::string nameSpaceOf(const CMPIObjectPath* path, CMPIStatus& status) {
     if (path == nullptr) {
         return {};
     }
-    const auto nameSpace = cim::ask<&CMPIObjectPathFT::getNameSpace>(path);
-    status = nameSpace.status;
-    if (!nameSpace.isOk() || nameSpace.value == nullptr) {
+    const CMPIString* string = path->ft->getNameSpace(path, &status);
+    if (status.rc != CMPI_RC_OK || string == nullptr) {
         return {};
     }
-    const auto characters = cim::ask<&CMPIStringFT::getCharPtr>(nameSpace.value);
-    status = characters.status;
-    return characters.isOk() && characters.value != nullptr ? characters.value : "";
+    const char* characters = string->ft->getCharPtr(string, &status);
+    return status.rc == CMPI_RC_OK && characters != nullptr ? characters : "";
 }
 
 /**

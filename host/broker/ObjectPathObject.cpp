@@ -79,7 +79,10 @@ CMPIStatus setNameSpaceFromObjectPath(CMPIObjectPath* path, const CMPIObjectPath
 }
 
 CMPIStatus setHostAndNameSpaceFromObjectPath(CMPIObjectPath* path, const CMPIObjectPath* source) {
-    return guarded([&] { copyClass(path, source).host = argument(source).host; });
+    return guarded([&] {
+        ObjectPath& target = copyClass(path, source);
+        target.host = argument(source).host;
+    });
 }
 
 // Qualifiers are not supported, as the broker's capabilities state.
