@@ -65,6 +65,8 @@ endmacro()
 # Documents that are not in the provider's package.
 set(package_of_agent.md ostrel-reference-agent)
 set(package_of_cimhost.md cimhost)
+set(package_of_serve.md cimhost)
+set(package_of_serve-configuration.md cimhost)
 set(package_of_fleet.md lease-warranty-fleet-common)
 set(package_of_lease-warranty-export.md lease-warranty-facts)
 set(package_of_lease-warranty-metrics.md lease-warranty-metrics)
