@@ -49,13 +49,18 @@ TEST_F(LibraryTest, ReportsAMissingProvider) {
     namespace fs = std::filesystem;
     const testsupport::TempDirectory others;
     const fs::path built = gateFile();
-    for (const auto& each : fs::directory_iterator(built.parent_path())) {
-        const std::string name = each.path().filename();
-        if (name.find(".so") != std::string::npos && name.find("LeaseAndWarrantyProvider") == std::string::npos) {
-            fs::copy(each.path(), others.path() / name);
+    fs::create_directory(others.path() / "cmpi");
+    // In an installation, the libraries that the gate is linked with are in the parent directory.
+    for (const fs::path& source : {built.parent_path(), built.parent_path().parent_path()}) {
+        for (const auto& each : fs::directory_iterator(source)) {
+            const std::string name = each.path().filename();
+            if (name.find(".so") != std::string::npos && name.find("LeaseAndWarrantyProvider") == std::string::npos) {
+                fs::copy(each.path(), others.path() / "cmpi" / name, fs::copy_options::skip_existing);
+                fs::copy(each.path(), others.path() / name, fs::copy_options::skip_existing);
+            }
         }
     }
-    testsupport::ProviderLibrary alone(others.path() / built.filename(), "LeaseAndWarrantyGate", broker);
+    testsupport::ProviderLibrary alone(others.path() / "cmpi" / built.filename(), "LeaseAndWarrantyGate", broker);
     CMPIStatus status{CMPI_RC_OK, nullptr};
     EXPECT_EQ(alone.createInstanceMI(broker.handle(), &status), nullptr);
     EXPECT_EQ(status.rc, CMPI_RC_ERR_FAILED);

@@ -180,7 +180,7 @@ TEST_F(StorageTest, RollingBackNeedsNoDiskSpace) {
 
 TEST_F(StorageTest, AProviderThatCannotBeLoadedAgainAnswersNothing) {
     create("L1", {named("Lessor", text("ACME"))});
-    void* const other = dlopen(PROVIDER_LIBRARY, RTLD_NOW);
+    void* const other = dlopen(testsupport::underTest(PROVIDER_LIBRARY).c_str(), RTLD_NOW);
     ASSERT_NE(other, nullptr);
     {
         const FullDisk disk(10);
