@@ -22,6 +22,13 @@ struct flock lockOfFile() {
     return lock;
 }
 
+/** Whoever may write to the directory may lock it. Another user's file keeps its mode. */
+void shareWithUsersOf(const std::string& directory, int descriptor) {
+    struct stat found {};
+    const bool isShared = stat(directory.c_str(), &found) == 0 && fchmod(descriptor, found.st_mode & 0666U) == 0;
+    static_cast<void>(isShared);
+}
+
 }  // namespace
 
 DirectoryLock::Result DirectoryLock::acquire(const std::string& directory) {
@@ -35,6 +42,7 @@ DirectoryLock::Result DirectoryLock::acquire(const std::string& directory) {
     struct flock lock = lockOfFile();
     if (isOpen && fcntl(descriptor, F_SETLK, &lock) == 0) {
         process = getpid();
+        shareWithUsersOf(directory, descriptor);
         writeOwner();
         return {State::acquired};
     }

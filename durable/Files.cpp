@@ -69,12 +69,17 @@ public:
         }
     }
 
-    /** Copies owner, group and mode. If the owner cannot be copied, only the new owner has access. */
+    /**
+     * Copies owner, group and mode as far as permitted. If the group cannot be copied, only the new owner has access. A
+     * file of another user keeps its mode.
+     */
     void beLike(const std::string& model) const {
         struct stat found {};
         if (stat(model.c_str(), &found) == 0) {
-            const bool isOwned = fchown(number, found.st_uid, found.st_gid) == 0;
-            require(fchmod(number, found.st_mode & (isOwned ? 0777U : 0700U)) == 0, path);
+            const bool hasGroup = fchown(number, static_cast<uid_t>(-1), found.st_gid) == 0;
+            const bool hasOwner = fchown(number, found.st_uid, static_cast<gid_t>(-1)) == 0;
+            const bool hasMode = fchmod(number, found.st_mode & (hasGroup ? 0777U : 0700U)) == 0;
+            require(hasMode || (errno == EPERM && !hasOwner), path);
         }
     }
 

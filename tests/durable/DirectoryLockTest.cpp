@@ -128,6 +128,20 @@ TEST_F(DirectoryLockTest, IsDeniedToAProcessThatMustNotWriteItsFile) {
               static_cast<int>(geteuid() == 0 ? State::denied : State::acquired));
 }
 
+TEST_F(DirectoryLockTest, IsOpenToUsersWhoMayWriteToTheDirectory) {
+    std::filesystem::permissions(directory.path(), std::filesystem::perms(0777));
+    held.acquire(path);
+    held.release();
+    EXPECT_EQ(inChild([&] {
+                  constexpr uid_t unprivileged = 65534;
+                  DirectoryLock lock;
+                  return geteuid() == 0 && setresuid(unprivileged, unprivileged, unprivileged) != 0
+                             ? 127
+                             : static_cast<int>(lock.acquire(path).state);
+              }),
+              static_cast<int>(State::acquired));
+}
+
 TEST_F(DirectoryLockTest, ReportsWhyItIsUnavailable) {
     const DirectoryLock::Result result = held.acquire("/nonexistent/directory/");
     EXPECT_EQ(result.state, State::unavailable);

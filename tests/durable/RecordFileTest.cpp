@@ -4,6 +4,8 @@
 #include <gtest/gtest.h>
 
 #include <sys/stat.h>
+#include <sys/wait.h>
+#include <unistd.h>
 
 #include <filesystem>
 #include <string>
@@ -46,6 +48,30 @@ protected:
     const fs::path second = in("Warranty.dat.saved2");
     const fs::path damaged = in("Warranty.dat.damaged");
 };
+
+TEST_F(RecordFileTest, AUserWithAccessToTheFilesOverwritesTheCopiesOfAnother) {
+    writeFile(path, records({"W1"}));
+    fs::permissions(path, fs::perms(0666));
+    prepare();
+    prepare();
+    fs::permissions(directory.path(), fs::perms(0777));
+    const pid_t child = fork();
+    if (child == 0) {
+        constexpr uid_t unprivileged = 65534;
+        const bool isOther = geteuid() != 0 || setresuid(unprivileged, unprivileged, unprivileged) == 0;
+        try {
+            prepare();
+            prepare();
+        } catch (const std::exception&) {
+            _exit(1);
+        }
+        _exit(isOther ? 0 : 2);
+    }
+    int status = -1;
+    waitpid(child, &status, 0);
+    EXPECT_EQ(status, 0);
+    EXPECT_EQ(fs::status(saved).permissions(), fs::perms(0666));
+}
 
 TEST_F(RecordFileTest, AFileIsCompleteIfItHasThePromisedLines) {
     for (const std::string& content : {records({"W1", "W2"}), records({}), std::string("0"), "\n " + records({"W1"}),
