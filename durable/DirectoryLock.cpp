@@ -22,7 +22,7 @@ struct flock lockOfFile() {
     return lock;
 }
 
-/** Whoever may write to the directory may lock it. Another user's file keeps its mode. */
+/** Lets all users lock the file who may write to the directory. Another user's file keeps its mode. */
 void shareWithUsersOf(const std::string& directory, int descriptor) {
     struct stat found {};
     const bool isShared = stat(directory.c_str(), &found) == 0 && fchmod(descriptor, found.st_mode & 0666U) == 0;
