@@ -37,10 +37,12 @@ bool DataDirectory::exists() const {
 }
 
 DataDirectory::Ownership DataDirectory::acquire() {
+    const bool hadOtherOwner = hasOtherOwner;
+    hasOtherOwner = true;  // if an exception leaves the question open
     const DirectoryLock::Result result = acquireLock();
     const bool isOther = result.state == DirectoryLock::State::heldByOther;
     // Without record files, the provider's records are the only ones.
-    hasOtherOwner = hasOtherOwner || (result.state == DirectoryLock::State::acquired && stamp() != Stamp{});
+    hasOtherOwner = hadOtherOwner || (result.state == DirectoryLock::State::acquired && stamp() != Stamp{});
     return {isOwner, isOther,
             "The data directory " + path() +
                 (isOther ? " is in use by " + result.reason + ". Send the request to that process, or end it."

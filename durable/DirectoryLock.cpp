@@ -68,6 +68,7 @@ bool DirectoryLock::isHeldIn(const std::string& path) const {
 }
 
 void DirectoryLock::release() {
+    process = 0;
     if (descriptor >= 0) {
         close(descriptor);
         descriptor = -1;

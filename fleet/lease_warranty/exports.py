@@ -30,6 +30,8 @@ def checked(data):
 def machine_of(name, document):
     """@throws ValueError"""
     facts = document.get("ansible_facts", document) if isinstance(document, dict) else {}
+    if not isinstance(facts, dict):
+        raise ValueError("ansible_facts is not an object")
     if not any(key.startswith(("ansible_", "module_setup", "gather_subset")) for key in facts):
         return Machine(name, checked(document), "")
     local = facts.get("ansible_local")
@@ -42,7 +44,7 @@ def machine_of(name, document):
 def read_file(path):
     try:
         return machine_of(path.name.removesuffix(".json"), json.loads(path.read_text(encoding="utf-8")))
-    except (OSError, ValueError) as error:
+    except (OSError, ValueError, RecursionError) as error:
         raise Unreadable(f"{path} cannot be read: {error}") from error
 
 

@@ -27,6 +27,6 @@ def run(main, name):
     """Runs the main function and ends the process."""
     try:
         main()
-    except (Unreadable, OSError) as error:
+    except (Unreadable, OSError, UnicodeError) as error:
         print(f"{name}: {error}", file=sys.stderr)
         sys.exit(1)

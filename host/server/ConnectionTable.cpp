@@ -98,7 +98,8 @@ bool ConnectionTable::isOverdue(Connection& connection, Connection::Clock::time_
     if (connection.headSince == Connection::Clock::time_point{}) {
         connection.headSince = now;
     }
-    return now - connection.headSince > limits.headTime;
+    // Two samples may be of different requests: then the phase is younger.
+    return age > limits.headTime && now - connection.headSince > limits.headTime;
 }
 
 void ConnectionTable::endOverdue(Connection::Clock::time_point now) {

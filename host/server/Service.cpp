@@ -54,7 +54,7 @@ void reload(Certificates* certificates, AccessLog& log) {
             certificates->reload();
         }
         log.write("reloaded");
-    } catch (const SettingsError& error) {
+    } catch (const std::exception& error) {
         log.write(std::string("the old certificate remains in use: ") + error.what());
     }
     ::sd_notify(0, "READY=1");

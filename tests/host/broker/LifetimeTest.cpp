@@ -89,7 +89,7 @@ TEST_F(LifetimeTest, EveryTypeCanBeClonedAndReleased) {
     check(make().newDateTime(handle(), nullptr));
     check(scope->context({}));
     check(make().newCMPIError(handle(), "o", "i", "m", ErrorSevLow, ErrorProbCauseUnknown, CMPI_RC_OK, nullptr));
-    check(scope->arena().make<CMPIEnumeration>({CMPI_uint8, {{std::uint8_t{1}}}, 0}));
+    check(scope->arena().make<CMPIEnumeration>({{CMPI_uint8, {std::uint8_t{1}}}, 0}));
 }
 
 TEST_F(LifetimeTest, ReleasingAMarkFreesLaterObjects) {
