@@ -32,6 +32,8 @@ def machine_of(name, document):
     facts = document.get("ansible_facts", document) if isinstance(document, dict) else {}
     if not isinstance(facts, dict):
         raise ValueError("ansible_facts is not an object")
+    if facts.get("unreachable") is True or facts.get("failed") is True:
+        return Machine(name, None, f"Ansible got no facts: {facts.get('msg', 'no reason given')}")
     if not any(key.startswith(("ansible_", "module_setup", "gather_subset")) for key in facts):
         return Machine(name, checked(document), "")
     local = facts.get("ansible_local")
