@@ -33,6 +33,12 @@ std::size_t endedLinesIn(std::string_view content) {
     return static_cast<std::size_t>(std::count(content.begin(), content.end(), '\n'));
 }
 
+/** The content after the line of the count. */
+std::string_view recordsIn(std::string_view content) {
+    const std::string_view lines = withoutLeadingSpace(content);
+    return lines.substr(std::min(lines.find('\n'), lines.size() - 1) + 1);
+}
+
 bool endsWith(std::string_view content, std::string_view end) {
     return content.size() >= end.size() && content.substr(content.size() - end.size()) == end;
 }
@@ -80,6 +86,12 @@ bool RecordFile::isComplete(std::string_view content) const {
     return promised && !hasHoles && hasEnd && presentIn(content) == *promised;
 }
 
+bool RecordFile::addsOneRecord(std::string_view content, std::string_view former) const {
+    const std::string_view records = recordsIn(content);
+    const std::string_view before = recordsIn(former);
+    return records.substr(0, before.size()) == before && endedLinesIn(records.substr(before.size())) == lines;
+}
+
 SavedCopies::Copy RecordFile::savedCopy() const {
     SavedCopies::Copy copy = copies.latest();
     copy.content.resize(isComplete(copy.content) ? copy.content.size() : 0);
@@ -119,7 +131,8 @@ std::string RecordFile::defect() const {
     if (!isComplete(*current)) {
         return name + countsOf(*current);
     }
-    return savedCopy().isUnfinished ? name + " held an unfinished change." : "";
+    const SavedCopies::Copy copy = savedCopy();
+    return copy.isUnfinished && addsOneRecord(*current, copy.content) ? name + " held an unfinished change." : "";
 }
 
 bool RecordFile::needsRecovery() const {

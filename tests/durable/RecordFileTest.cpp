@@ -258,6 +258,17 @@ TEST_F(RecordFileTest, AnUnfinishedChangeIsNotTakenForAnAnsweredOne) {
     EXPECT_THAT(file.recover(), IsEmpty()) << "it is finished now";
 }
 
+TEST_F(RecordFileTest, AnotherCompleteFileIsKeptAlthoughAChangeIsUnfinished) {
+    for (const std::string& edited :
+         {records({"W1"}), records({"W1", "W2", "W3"}), records({"W3", "W2"}), records({}), std::string("0")}) {
+        writeFile(path, records({"W1"}));
+        prepare(true);
+        writeFile(path, edited);
+        EXPECT_THAT(file.recover(), IsEmpty()) << edited;
+        EXPECT_EQ(readFile(path), edited);
+    }
+}
+
 TEST_F(RecordFileTest, ACommittedChangeIsSavedAndFinished) {
     writeFile(path, records({"W1"}));
     prepare(true);
