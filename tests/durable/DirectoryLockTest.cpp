@@ -39,6 +39,17 @@ protected:
         }));
     }
 
+    /** The result of a process of another user or, unless this one is of root, of the same user. */
+    State stateOfAnotherUser() {
+        return static_cast<State>(inChild([&] {
+            constexpr uid_t unprivileged = 65534;
+            DirectoryLock lock;
+            return geteuid() == 0 && setresuid(unprivileged, unprivileged, unprivileged) != 0
+                       ? 127
+                       : static_cast<int>(lock.acquire(path).state);
+        }));
+    }
+
     const testsupport::TempDirectory directory;
     const std::string path = directory.withSlash();
     DirectoryLock held;
@@ -118,28 +129,14 @@ TEST_F(DirectoryLockTest, IsDeniedToAProcessThatMustNotWriteItsFile) {
     held.acquire(path);
     held.release();
     std::filesystem::permissions(directory.path(), std::filesystem::perms(0755));
-    EXPECT_EQ(inChild([&] {
-                  constexpr uid_t unprivileged = 65534;
-                  DirectoryLock lock;
-                  return geteuid() == 0 && setresuid(unprivileged, unprivileged, unprivileged) != 0
-                             ? 127
-                             : static_cast<int>(lock.acquire(path).state);
-              }),
-              static_cast<int>(geteuid() == 0 ? State::denied : State::acquired));
+    EXPECT_EQ(stateOfAnotherUser(), geteuid() == 0 ? State::denied : State::acquired);
 }
 
 TEST_F(DirectoryLockTest, IsOpenToUsersWhoMayWriteToTheDirectory) {
     std::filesystem::permissions(directory.path(), std::filesystem::perms(0777));
     held.acquire(path);
     held.release();
-    EXPECT_EQ(inChild([&] {
-                  constexpr uid_t unprivileged = 65534;
-                  DirectoryLock lock;
-                  return geteuid() == 0 && setresuid(unprivileged, unprivileged, unprivileged) != 0
-                             ? 127
-                             : static_cast<int>(lock.acquire(path).state);
-              }),
-              static_cast<int>(State::acquired));
+    EXPECT_EQ(stateOfAnotherUser(), State::acquired);
 }
 
 TEST_F(DirectoryLockTest, ReportsWhyItIsUnavailable) {
