@@ -10,7 +10,7 @@
 namespace KO::LeaseWarrantyProvider {
 
 /**
- * Finds the records of a table by identifier in constant time: a hash table whose chains are in table order. Needs two
+ * Finds the records of a table by identifier in constant time: a hash table whose chains are in table order. Needs three
  * words per record. Contains deleted records, too; an identifier may occur more than once.
  */
 template <class Unit>
