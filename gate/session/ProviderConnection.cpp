@@ -123,7 +123,8 @@ void ProviderConnection::requireCurrent(LockGuard& guard) {
             fail(CMPI_RC_ERR_FAILED,
                  "The provider waits for the object manager and cannot be loaded again. Try again.");
         }
-        if (isOutdated && !theDirectory.exists()) {  // it would have no records
+        const bool hasLoaded = isOutdated || library.isLoaded();
+        if (hasLoaded && !theDirectory.exists()) {  // it would have no records
             fail(CMPI_RC_ERR_FAILED, "The data directory does not exist. Restore it and try again.");
         }
         load();

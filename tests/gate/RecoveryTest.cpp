@@ -132,6 +132,22 @@ std::set<std::string> namesInDirectory() {
     return names;
 }
 
+TEST_F(RecoveryTest, AReaderReportsThatTheDirectoryVanished) {
+    create("L1");
+    unload();
+    fs::permissions(dataFile("Lease.dat"), fs::perms(0644));
+    gate();
+    {
+        const UnwritableDirectory unwritable(agentEnvironment::dataDirectory());
+        EXPECT_THAT(identifiers(), ElementsAre("L1"));
+    }
+    const fs::path away = agentEnvironment::directory() / "away";
+    fs::rename(agentEnvironment::dataDirectory(), away);
+    EXPECT_THAT(gate().enumerateInstances(classPath("VELKO_Lease")), isRefused(CMPI_RC_ERR_FAILED, "does not exist"));
+    fs::rename(away, agentEnvironment::dataDirectory());
+    EXPECT_THAT(identifiers(), ElementsAre("L1"));
+}
+
 TEST_F(RecoveryTest, AProcessThatMustNotWriteReadsWithoutLockAndCopies) {
     for (const bool hasOwnerFile : {true, false}) {
         create("L1");
