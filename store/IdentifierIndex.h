@@ -10,8 +10,8 @@
 namespace KO::LeaseWarrantyProvider {
 
 /**
- * Finds the records of a table by identifier in constant time: a hash table whose chains are in table order. Needs three
- * words per record. Contains deleted records, too; an identifier may occur more than once.
+ * Finds the records of a table by identifier in constant time: a hash table whose chains are in table order. Needs
+ * three words per record. Contains deleted records, too; an identifier may occur more than once.
  */
 template <class Unit>
 class IdentifierIndex {
