@@ -33,7 +33,7 @@ std::string described(const ResultEvent& event) {
     if (const auto* path = std::get_if<cimhost::ObjectPath>(&event)) {
         return cimhost::formatObjectPath(*path);
     }
-    if (const auto* instance = std::get_if<cimhost::Instance>(&event)) {
+    if (const auto* instance = cimhost::resultOf<cimhost::Instance>(event)) {
         std::string description = cimhost::formatObjectPath(instance->path) + '\n';
         for (const cimhost::NamedValue& property : instance->properties) {
             description += described(property);

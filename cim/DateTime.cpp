@@ -9,9 +9,8 @@
 namespace cim {
 namespace {
 
-bool isDigit(char c) {
-    return c >= '0' && c <= '9';
-}
+/** A function object, which algorithms call inline. */
+constexpr auto isDigit = [](char c) { return c >= '0' && c <= '9'; };
 
 bool all(std::string_view string, char c) {
     return std::all_of(string.begin(), string.end(), [&](char each) { return each == c; });

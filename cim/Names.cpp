@@ -5,10 +5,6 @@
 namespace cim {
 namespace {
 
-char lower(char c) {
-    return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c;
-}
-
 bool startsName(char c) {
     return (lower(c) >= 'a' && lower(c) <= 'z') || c == '_';
 }
@@ -18,11 +14,6 @@ bool continuesName(char c) {
 }
 
 }  // namespace
-
-bool sameName(std::string_view left, std::string_view right) {
-    return left.size() == right.size() &&
-           std::equal(left.begin(), left.end(), right.begin(), [](char a, char b) { return lower(a) == lower(b); });
-}
 
 std::string foldedName(std::string_view name) {
     std::string folded(name);

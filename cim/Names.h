@@ -7,8 +7,17 @@
 
 namespace cim {
 
+/** A letter A to Z in lower case; any other character unchanged. */
+constexpr char lower(char c) {
+    return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c;
+}
+
 /** Whether two names are the same: the case of the letters A to Z is ignored, in every locale. */
-bool sameName(std::string_view left, std::string_view right);
+inline bool sameName(std::string_view left, std::string_view right) {
+    const auto sameLetter = [](char a, char b) { return lower(a) == lower(b); };
+    return left.size() == right.size() &&
+           (left == right || std::equal(left.begin(), left.end(), right.begin(), sameLetter));
+}
 
 /** The element of a container whose member `name` is the same name; null if there is none. */
 template <class Elements>

@@ -56,7 +56,7 @@ bool isSettled(const Schema& schema, const cimhost::ObjectPath& path, const std:
 
 /** Whether references in a value are read in the same way again: their classes may have been declared after them. */
 bool isSettled(const Schema& schema, const Value& value, const std::string& referenceClass) {
-    return std::all_of(value.elements.begin(), value.elements.end(), [&](const cimhost::Scalar& element) {
+    return std::all_of(value.elements().begin(), value.elements().end(), [&](const cimhost::Scalar& element) {
         const auto* path = std::get_if<std::shared_ptr<const cimhost::ObjectPath>>(&element);
         return path == nullptr || isSettled(schema, **path, referenceClass);
     });

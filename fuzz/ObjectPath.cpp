@@ -44,7 +44,7 @@ void requireSound(const cimhost::ObjectPath& path) {
     require(!path.nameSpace.empty(), "a path has a namespace");
     for (const cimhost::NamedValue& key : path.keys) {
         require(cim::isName(key.name), "a key has a name");
-        require(!key.value.isNull && key.value.elements.size() == 1, "a key has a value");
+        require(!key.value.isNull && key.value.elements().size() == 1, "a key has a value");
     }
 }
 

@@ -29,7 +29,7 @@ const Value* valueNamed(const std::vector<NamedValue>& values, const char* name)
 /** The element of a value that is neither null nor an array; null for others. */
 const cimhost::Scalar* scalarOf(const std::vector<NamedValue>& values, const char* name) {
     const Value* value = valueNamed(values, name);
-    return value == nullptr || value->isNull || value->isArray ? nullptr : &value->elements.front();
+    return value == nullptr || value->isNull || value->isArray ? nullptr : &value->single;
 }
 
 struct AsNumber {

@@ -26,11 +26,16 @@ public:
 
     /** Creates an object with this content. The handle is valid for the lifetime of the arena. */
     template <class Handle>
-    Handle* make(typename Traits<Handle>::Content content) {
+    Handle* make(typename Traits<Handle>::Content&& content) {
         auto object = std::make_unique<Encapsulated<Handle>>(*this, tables, std::move(content));
         Handle* handle = &object->handle;
         adopt(std::move(object));
         return handle;
+    }
+
+    template <class Handle>
+    Handle* make(const typename Traits<Handle>::Content& content) {
+        return make<Handle>(typename Traits<Handle>::Content(content));
     }
 
     /** Marks the current position for releaseMark(). @return owned by the arena */

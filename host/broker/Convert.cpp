@@ -51,6 +51,20 @@ bool anyPlainType(Action action) {
     return std::apply([&](const auto&... each) { return (action(each) || ...); }, plainTypes);
 }
 
+Scalar readPlain(const CMPIValue& value, CMPIType type) {
+    Scalar scalar;
+    const bool found = anyPlainType([&](const auto& each) {
+        if (each.type == type) {
+            scalar = each.read(value);
+        }
+        return each.type == type;
+    });
+    if (!found) {
+        throw Failure(CMPI_RC_ERR_INVALID_DATA_TYPE);
+    }
+    return scalar;
+}
+
 Scalar readEncapsulated(const CMPIValue& value, CMPIType type) {
     switch (type) {
         case CMPI_string:
@@ -60,7 +74,7 @@ Scalar readEncapsulated(const CMPIValue& value, CMPIType type) {
         case CMPI_ref:
             return std::make_shared<const ObjectPath>(argument(value.ref));
         case CMPI_instance:
-            return std::make_shared<const Instance>(argument(value.inst).value);
+            return std::shared_ptr<const Instance>(argument(value.inst).value.share());
         default:
             throw Failure(CMPI_RC_ERR_INVALID_DATA_TYPE);
     }
@@ -82,7 +96,7 @@ struct EncapsulatedWriter {
         value.ref = arena.make<CMPIObjectPath>(*path);
     }
     void operator()(const std::shared_ptr<const Instance>& instance) const {
-        value.inst = arena.make<CMPIInstance>({*instance, nullptr, {}});
+        value.inst = arena.make<CMPIInstance>({SharedInstance(*instance)});
     }
     template <class Plain>
     void operator()(const Plain&) const {}
@@ -142,33 +156,33 @@ Scalar scalarFrom(const CMPIValue* value, CMPIType type) {
         return std::monostate{};
     }
     if (type == CMPI_chars) {
-        return std::string(reinterpret_cast<const char*>(value));
+        return Scalar(std::in_place_type<std::string>, reinterpret_cast<const char*>(value));
     }
     if (isEncapsulated(type)) {
         return lacksObject(*value, type) ? Scalar{} : readEncapsulated(*value, type);
     }
-    Scalar scalar;
-    const bool found = anyPlainType([&](const auto& each) {
-        const bool matches = each.type == type;
-        scalar = matches ? each.read(*value) : Scalar{};
-        return matches;
-    });
-    if (!found) {
-        throw Failure(CMPI_RC_ERR_INVALID_DATA_TYPE);
-    }
-    return scalar;
+    return readPlain(*value, type);
 }
+
+namespace {
+
+Value singleFrom(const CMPIValue* value, CMPIType type) {
+    Value converted{type, false, false, false, scalarFrom(value, type), {}};
+    converted.isNull = std::holds_alternative<std::monostate>(converted.single);
+    if (converted.isNull || type == CMPI_chars) {
+        converted.type = elementType(type);  // scalarFrom() accepts other values only if they have a valid type.
+    }
+    return converted;
+}
+
+}  // namespace
 
 Value valueFrom(const CMPIValue* value, CMPIType type) {
     if (type == CMPI_null) {
         return {};
     }
-    const CMPIType element = elementType(type);
-    if ((type & CMPI_ARRAY) != 0) {
-        return arrayFrom(value == nullptr ? nullptr : value->array, element);
-    }
-    Scalar scalar = scalarFrom(value, type);
-    return Value::of(element, std::move(scalar));
+    return (type & CMPI_ARRAY) != 0 ? arrayFrom(value == nullptr ? nullptr : value->array, elementType(type))
+                                    : singleFrom(value, type);
 }
 
 CMPIData dataFrom(const Scalar& scalar, CMPIType type, Arena& arena) {
@@ -195,15 +209,14 @@ CMPIData dataFrom(const Value& value, Arena& arena) {
         CMPIData data = nullData(static_cast<CMPIType>(value.type | CMPI_ARRAY));
         if (!value.isNull) {
             data.state = CMPI_goodValue;
-            data.value.array = arena.make<CMPIArray>({value.type, value.elements});
+            data.value.array = arena.make<CMPIArray>({value.type, value.items});
         }
         return data;
     }
-    if (value.isStringWithoutCharacters()) {
+    if (value.lacksCharacters) {
         return dataWithoutCharacters(value.isNull, arena);
     }
-    return value.isNull || value.elements.empty() ? nullData(value.type)
-                                                  : dataFrom(value.elements.front(), value.type, arena);
+    return value.isNull ? nullData(value.type) : dataFrom(value.single, value.type, arena);
 }
 
 PropertyList propertyListFrom(const char** names) {

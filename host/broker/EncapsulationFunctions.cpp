@@ -18,11 +18,16 @@ Arena& arenaOf(const CMPIBroker* broker) {
     return Broker::of(broker).arena();
 }
 
-/** The keys of a path that are properties of the class. */
-std::vector<NamedValue> keyProperties(const ObjectPath& path, const ClassInfo& classInfo) {
+constexpr std::size_t usualPropertyCount = 16;
+
+/** The keys of a path that are properties of the class. The provider sets the others next. */
+std::vector<NamedValue> initialProperties(const ObjectPath& path, const ClassInfo* classInfo) {
     std::vector<NamedValue> properties;
-    properties.reserve(classInfo.properties.size());  // The provider sets the others next.
-    for (const PropertyInfo& property : classInfo.properties) {
+    properties.reserve(classInfo == nullptr ? usualPropertyCount : classInfo->properties.size());
+    if (classInfo == nullptr) {
+        return properties;
+    }
+    for (const PropertyInfo& property : classInfo->properties) {
         const NamedValue* key = property.isKey ? findNamed(path.keys, property.name) : nullptr;
         if (key != nullptr) {
             properties.push_back({property.name, key->value});
@@ -35,14 +40,12 @@ std::vector<NamedValue> keyProperties(const ObjectPath& path, const ClassInfo& c
 CMPIInstance* newInstance(const CMPIBroker* broker, const CMPIObjectPath* path, CMPIStatus* rc) {
     return guarded<CMPIInstance*>(rc, nullptr, [&] {
         Broker& owner = Broker::of(broker);
-        InstanceContent content;
-        content.value.path = argument(path);
-        content.classInfo = owner.classInfo(content.value.path.className);
-        if (content.classInfo) {
-            content.value.properties = keyProperties(content.value.path, *content.classInfo);
-            content.initialCount = content.value.properties.size();
-        }
-        return owner.arena().make<CMPIInstance>(std::move(content));
+        const ObjectPath& itsPath = argument(path);
+        auto classInfo = owner.classInfo(itsPath.className);
+        auto properties = initialProperties(itsPath, classInfo.get());
+        const std::size_t initialCount = properties.size();
+        return owner.arena().make<CMPIInstance>(
+            {SharedInstance({itsPath, std::move(properties)}), std::move(classInfo), {}, false, initialCount});
     });
 }
 
@@ -81,23 +84,23 @@ CMPIDateTime* newDateTime(const CMPIBroker* broker, CMPIStatus* rc) {
 CMPIDateTime* newDateTimeFromBinary(const CMPIBroker* broker, CMPIUint64 microseconds, CMPIBoolean interval,
                                     CMPIStatus* rc) {
     return guarded<CMPIDateTime*>(rc, nullptr, [&] {
-        const std::optional<std::string> formatted =
+        std::optional<std::string> formatted =
             interval != 0 ? formatInterval(microseconds) : formatTime(static_cast<std::int64_t>(microseconds));
         if (!formatted) {
             throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "The time is out of range.");
         }
-        return arenaOf(broker).make<CMPIDateTime>({*formatted});
+        return arenaOf(broker).make<CMPIDateTime>({*std::move(formatted)});
     });
 }
 
 CMPIDateTime* newDateTimeFromChars(const CMPIBroker* broker, const char* characters, CMPIStatus* rc) {
     return guarded<CMPIDateTime*>(rc, nullptr, [&] {
         Arena& arena = arenaOf(broker);
-        const std::string dateTime = argument(characters);
+        std::string dateTime = argument(characters);
         if (!cim::isDateTime(dateTime)) {
             throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "'" + dateTime + "' is not a CIM datetime.");
         }
-        return arena.make<CMPIDateTime>({dateTime});
+        return arena.make<CMPIDateTime>({std::move(dateTime)});
     });
 }
 

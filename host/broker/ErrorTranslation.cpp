@@ -34,11 +34,4 @@ Status statusOfCurrentException() noexcept {
     }
 }
 
-std::string argument(const char* characters) {
-    if (characters == nullptr) {
-        throw Failure(CMPI_RC_ERR_INVALID_PARAMETER);
-    }
-    return characters;
-}
-
 }  // namespace cimhost

@@ -91,8 +91,13 @@ typename Traits<Handle>::Content& argument(const Handle* handle) {
     return *object->content;
 }
 
-/** The string of an argument. @throws Failure with CMPI_RC_ERR_INVALID_PARAMETER if it is null */
-std::string argument(const char* characters);
+/** An argument that must not be null. @throws Failure with CMPI_RC_ERR_INVALID_PARAMETER if it is */
+inline const char* argument(const char* characters) {
+    if (characters == nullptr) {
+        throw Failure(CMPI_RC_ERR_INVALID_PARAMETER);
+    }
+    return characters;
+}
 
 /** The string of an optional argument; none if it is null. */
 inline std::optional<std::string> optionalString(const char* characters) {

@@ -1,4 +1,5 @@
 #include <algorithm>
+#include <string_view>
 
 #include "broker/Convert.h"
 #include "broker/Encapsulation.h"
@@ -9,36 +10,35 @@
 namespace cimhost {
 namespace {
 
-bool isKey(const InstanceContent& instance, const std::string& name) {
+bool isKey(const InstanceContent& instance, std::string_view name) {
     const PropertyInfo* property = instance.classInfo ? findNamed(instance.classInfo->properties, name) : nullptr;
-    return property != nullptr ? property->isKey : findNamed(instance.value.path.keys, name) != nullptr;
+    return property != nullptr ? property->isKey : findNamed(instance.value->path.keys, name) != nullptr;
 }
 
 /** Whether the property filter accepts a property. It usually accepts keys, which identify the instance. */
-bool accepts(const InstanceContent& instance, const std::string& name) {
+bool accepts(const InstanceContent& instance, std::string_view name) {
     const PropertyList& list = instance.accepted;
     return !list || (!instance.filtersKeys && isKey(instance, name)) ||
            std::any_of(list->begin(), list->end(), [&](const std::string& each) { return cim::sameName(each, name); });
 }
 
 /** @throws Failure if the class is known and does not have the property, or has it with another type */
-void checkAgainstClass(const ClassInfo* classInfo, const std::string& name, const Value& value) {
+void checkAgainstClass(const ClassInfo* classInfo, std::string_view name, const Value& value) {
     if (classInfo == nullptr) {
         return;
     }
     const PropertyInfo* property = findNamed(classInfo->properties, name);
     if (property == nullptr) {
-        throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY, classInfo->name + " has no property " + name + ".");
+        throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY, classInfo->name + " has no property " + std::string(name) + ".");
     }
     const bool isUntypedNull = value.isNull && value.type == CMPI_null;
     if (!isUntypedNull && (value.type != property->type || value.isArray != property->isArray)) {
-        throw Failure(CMPI_RC_ERR_TYPE_MISMATCH, classInfo->name + "." + name + " has another type.");
+        throw Failure(CMPI_RC_ERR_TYPE_MISMATCH, classInfo->name + "." + std::string(name) + " has another type.");
     }
 }
 
 /** Removes a property that the broker added: the order is that in which the provider sets properties. */
-void removeInitial(InstanceContent& target, const std::string& name) {
-    auto& values = target.value.properties;
+void removeInitial(InstanceContent& target, std::vector<NamedValue>& values, std::string_view name) {
     const auto end = values.begin() + static_cast<std::ptrdiff_t>(target.initialCount);
     const auto found =
         std::find_if(values.begin(), end, [&](const NamedValue& each) { return cim::sameName(each.name, name); });
@@ -51,15 +51,16 @@ void removeInitial(InstanceContent& target, const std::string& name) {
 CMPIStatus setProperty(const CMPIInstance* instance, const char* name, const CMPIValue* value, CMPIType type) {
     return guarded([&] {
         InstanceContent& target = content(instance);
-        std::string property = argument(name);
+        const std::string_view property = argument(name);
         if (property.empty()) {
             throw Failure(CMPI_RC_ERR_INVALID_PARAMETER);
         }
         Value converted = valueFrom(value, type);
         checkAgainstClass(target.classInfo.get(), property, converted);
         if (accepts(target, property)) {
-            removeInitial(target, property);
-            setNamed(target.value.properties, std::move(property), std::move(converted));
+            std::vector<NamedValue>& values = target.value.writable().properties;
+            removeInitial(target, values, property);
+            setNamed(values, property, std::move(converted));
         }
     });
 }
@@ -69,7 +70,7 @@ CMPIStatus setPropertyWithOrigin(const CMPIInstance* instance, const char* name,
     return setProperty(instance, name, value, type);  // the class declares the origin
 }
 
-CMPIData asProperty(CMPIData data, const InstanceContent& instance, const std::string& name) {
+CMPIData asProperty(CMPIData data, const InstanceContent& instance, std::string_view name) {
     if (isKey(instance, name)) {
         data.state = static_cast<CMPIValueState>(data.state | CMPI_keyValue);
     }
@@ -79,7 +80,7 @@ CMPIData asProperty(CMPIData data, const InstanceContent& instance, const std::s
 CMPIData getProperty(const CMPIInstance* instance, const char* name, CMPIStatus* rc) {
     return guarded(rc, badData(), [&] {
         const auto& object = self(instance);
-        const CMPIData data = namedData(object.content->value.properties, name, arenaFor(object));
+        const CMPIData data = namedData(object.content->value->properties, name, arenaFor(object));
         return asProperty(data, *object.content, name);
     });
 }
@@ -87,27 +88,28 @@ CMPIData getProperty(const CMPIInstance* instance, const char* name, CMPIStatus*
 CMPIData getPropertyAt(const CMPIInstance* instance, CMPICount index, CMPIString** name, CMPIStatus* rc) {
     return guarded(rc, badData(), [&] {
         const auto& object = self(instance);
-        const auto& properties = object.content->value.properties;
+        const auto& properties = object.content->value->properties;
         const CMPIData data = namedDataAt(properties, index, name, arenaFor(object));
         return asProperty(data, *object.content, properties[index].name);
     });
 }
 
 CMPICount getPropertyCount(const CMPIInstance* instance, CMPIStatus* rc) {
-    return guarded<CMPICount>(rc, 0, [&] { return static_cast<CMPICount>(content(instance).value.properties.size()); });
+    return guarded<CMPICount>(rc, 0,
+                              [&] { return static_cast<CMPICount>(content(instance).value->properties.size()); });
 }
 
 CMPIObjectPath* getObjectPath(const CMPIInstance* instance, CMPIStatus* rc) {
     return guarded<CMPIObjectPath*>(rc, nullptr, [&] {
         const auto& object = self(instance);
-        return arenaFor(object).make<CMPIObjectPath>(object.content->value.path);
+        return arenaFor(object).make<CMPIObjectPath>(object.content->value->path);
     });
 }
 
 CMPIStatus setObjectPath(CMPIInstance* instance, const CMPIObjectPath* path) {
     return guarded([&] {
         InstanceContent& target = content(instance);
-        target.value.path = argument(path);
+        target.value.writable().path = argument(path);
     });
 }
 
@@ -116,7 +118,7 @@ CMPIStatus filter(CMPIInstance* instance, const char** properties, bool filtersK
         InstanceContent& target = content(instance);
         target.accepted = propertyListFrom(properties);
         target.filtersKeys = filtersKeys;
-        auto& values = target.value.properties;
+        auto& values = target.value.writable().properties;
         const auto isHidden = [&](const NamedValue& each) { return !accepts(target, each.name); };
         const auto initialEnd = values.begin() + static_cast<std::ptrdiff_t>(target.initialCount);
         target.initialCount -= static_cast<std::size_t>(std::count_if(values.begin(), initialEnd, isHidden));

@@ -7,11 +7,11 @@
 
 namespace cimhost {
 
-void setNamed(std::vector<NamedValue>& values, std::string name, Value value) {
+void setNamed(std::vector<NamedValue>& values, std::string_view name, Value&& value) {
     if (NamedValue* found = findNamed(values, name)) {
         found->value = std::move(value);
     } else {
-        values.push_back({std::move(name), std::move(value)});
+        values.emplace_back(std::string(name), std::move(value));
     }
 }
 

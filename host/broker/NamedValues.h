@@ -17,7 +17,7 @@ namespace cimhost {
 using cim::findNamed;
 
 /** Replaces the value of this name, or appends one. */
-void setNamed(std::vector<NamedValue>& values, std::string name, Value value);
+void setNamed(std::vector<NamedValue>& values, std::string_view name, Value&& value);
 
 /** The value of this name as CMPI data. @throws Failure with CMPI_RC_ERR_NO_SUCH_PROPERTY if there is none */
 CMPIData namedData(const std::vector<NamedValue>& values, const char* name, Arena& arena);

@@ -54,7 +54,7 @@ public:
     using Content = typename Traits<Handle>::Content;
     using Table = std::remove_pointer_t<decltype(Handle::ft)>;
 
-    Encapsulated(Arena& itsOwner, const FunctionTables& tables, Content initial)
+    Encapsulated(Arena& itsOwner, const FunctionTables& tables, Content&& initial)
         : Object(itsOwner, Traits<Handle>::kind),
           // CMPI's handles point to tables without const, but callers do not write to them.
           handle{static_cast<Object*>(this), const_cast<Table*>(&(tables.*Traits<Handle>::table))},

@@ -6,6 +6,7 @@
 #include <memory>
 #include <optional>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "broker/ClassInfo.h"
@@ -19,9 +20,34 @@ namespace cimhost {
 /** The kinds of encapsulated objects. */
 enum class ObjectKind { string, objectPath, instance, dateTime, array, enumeration, args, context, result, error };
 
+/** An instance that can be shared with results, and is copied when it changes after that. */
+class SharedInstance {
+public:
+    explicit SharedInstance(Instance initial) : instance(std::make_shared<Instance>(std::move(initial))) {}
+    SharedInstance(const SharedInstance& other) : SharedInstance(*other) {}
+    SharedInstance(SharedInstance&&) noexcept = default;
+    SharedInstance& operator=(SharedInstance) = delete;
+
+    const Instance& operator*() const { return *instance; }
+    const Instance* operator->() const { return instance.get(); }
+
+    std::shared_ptr<Instance> share() const { return instance; }
+
+    /** The instance, which nobody shares. */
+    Instance& writable() {
+        if (instance.use_count() > 1) {
+            instance = std::make_shared<Instance>(*instance);
+        }
+        return *instance;
+    }
+
+private:
+    std::shared_ptr<Instance> instance;
+};
+
 /** Content of a CMPIInstance. */
 struct InstanceContent {
-    Instance value{};
+    SharedInstance value;
     std::shared_ptr<const ClassInfo> classInfo{};  ///< null if the class is unknown
     PropertyList accepted{};                       ///< the property filter; none accepts every property
     bool filtersKeys = false;                      ///< whether the filter also applies to keys

@@ -24,7 +24,7 @@ std::string describe(const ObjectPath& path) {
 }
 
 std::string describe(const InstanceContent& instance) {
-    return formatMof(instance.value);
+    return formatMof(*instance.value);
 }
 
 std::string describe(const DateTime& time) {

@@ -26,7 +26,7 @@ CMPIString* getPart(const CMPIObjectPath* path, CMPIStatus* rc) {
 CMPIStatus addKey(CMPIObjectPath* path, const char* name, const CMPIValue* value, const CMPIType type) {
     return guarded([&] {
         ObjectPath& target = content(path);
-        const std::string key = argument(name);
+        const std::string_view key = argument(name);
         Value converted = valueFrom(value, type);
         if (key.empty() || converted.isNull) {
             throw Failure(CMPI_RC_ERR_INVALID_PARAMETER);  // a key always has a value

@@ -23,7 +23,7 @@ CMPIObjectPath* RequestScope::objectPath(const ObjectPath& path) {
 }
 
 CMPIInstance* RequestScope::instance(const Instance& instance) {
-    return objects.make<CMPIInstance>({instance, broker.classInfo(instance.path.className), {}});
+    return objects.make<CMPIInstance>({SharedInstance(instance), broker.classInfo(instance.path.className)});
 }
 
 CMPIResult* RequestScope::result(ResultEvents& events, const ResultRules& rules) {

@@ -46,7 +46,7 @@ CMPIStatus returnInstance(const CMPIResult* result, const CMPIInstance* instance
             throw Failure(CMPI_RC_ERR_NOT_SUPPORTED);
         }
         recordNull(target, instance);
-        target.events->emplace_back(argument(instance).value);
+        target.events->emplace_back(argument(instance).value.share());
     });
 }
 
@@ -75,7 +75,7 @@ CMPIStatus returnError(const CMPIResult* result, const CMPIError* error) {
     return guarded([&] {
         const ResultContent& target = content(result);
         recordNull(target, error);
-        target.events->emplace_back(argument(error));
+        target.events->emplace_back(std::make_shared<const ErrorInfo>(argument(error)));
     });
 }
 

@@ -102,7 +102,7 @@ CMPIInstance* getInstance(const CMPIBroker* handle, const CMPIContext* context, 
         Broker& broker = Broker::of(handle);
         Response response =
             performed(broker, context, Request::getInstance(argument(path), propertyListFrom(properties)));
-        return broker.arena().make<CMPIInstance>({firstOf(response.instances), nullptr, {}});
+        return broker.arena().make<CMPIInstance>({SharedInstance(firstOf(response.instances))});
     });
 }
 
@@ -111,7 +111,7 @@ CMPIObjectPath* createInstance(const CMPIBroker* handle, const CMPIContext* cont
     return guarded<CMPIObjectPath*>(rc, nullptr, [&] {
         Broker& broker = Broker::of(handle);
         Response response =
-            performed(broker, context, Request::createInstance(argument(path), argument(instance).value));
+            performed(broker, context, Request::createInstance(argument(path), *argument(instance).value));
         return broker.arena().make<CMPIObjectPath>(firstOf(response.paths));
     });
 }
@@ -121,7 +121,7 @@ CMPIStatus modifyInstance(const CMPIBroker* handle, const CMPIContext* context, 
     return guarded([&] {
         Broker& broker = Broker::of(handle);
         performed(broker, context,
-                  Request::modifyInstance(argument(path), argument(instance).value, propertyListFrom(properties)));
+                  Request::modifyInstance(argument(path), *argument(instance).value, propertyListFrom(properties)));
     });
 }
 

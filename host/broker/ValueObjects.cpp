@@ -113,7 +113,7 @@ template <class Handle>
 CMPIStatus addValue(const Handle* handle, const char* name, const CMPIValue* value, const CMPIType type) {
     return guarded([&] {
         std::vector<NamedValue>& values = content(handle);
-        const std::string valueName = argument(name);
+        const std::string_view valueName = argument(name);
         setNamed(values, valueName, valueFrom(value, type));
     });
 }

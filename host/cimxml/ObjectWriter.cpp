@@ -77,8 +77,25 @@ std::string_view xmlType(CMPIType type) {
     return type == CMPI_instance || type == CMPI_null ? std::string_view("string") : typeName(type);
 }
 
+std::string startTagOf(const NamedValue& property, const Property* declared) {
+    std::string xml;
+    appendStartTag(xml, elementOf(property.value), [&] {
+        appendAttribute(xml, "NAME", property.name);
+        if (declared != nullptr) {
+            appendAttribute(xml, "CLASSORIGIN", declared->origin);
+        }
+        if (property.value.type != CMPI_ref) {
+            appendAttribute(xml, "TYPE", xmlType(property.value.type));
+        }
+        if (property.value.type == CMPI_instance) {
+            appendAttribute(xml, "EmbeddedObject", "instance");
+        }
+    });
+    return xml;
+}
+
 void requireRepresentable(const Value& value, const std::string& className, const std::string& name) {
-    for (const Scalar& scalar : value.elements) {
+    for (const Scalar& scalar : value.elements()) {
         const auto* string = std::get_if<std::string>(&scalar);
         if (string != nullptr && !isRepresentable(*string)) {
             throw CimError(CMPI_RC_ERR_FAILED,
@@ -144,28 +161,29 @@ void ObjectWriter::append(std::string& xml, const ObjectPath& path, ObjectForm f
 void ObjectWriter::appendInstance(std::string& xml, const Instance& instance, const InstanceParts& parts) const {
     const Element element(xml, "INSTANCE", [&] { appendAttribute(xml, "CLASSNAME", instance.path.className); });
     const Class* known = parts.origins != nullptr ? parts.origins->findClass(instance.path.className) : nullptr;
+    std::size_t position = 0;
     for (const NamedValue& property : instance.properties) {
         if (isWanted(property.name, parts)) {
-            appendProperty(xml, property, known != nullptr ? known->findProperty(property.name) : nullptr);
+            xml += startTag(property, known != nullptr ? known->findProperty(property.name) : nullptr, position++);
+            appendValue(xml, property.value);
+            appendEndTag(xml, elementOf(property.value));
         }
     }
 }
 
-void ObjectWriter::appendProperty(std::string& xml, const NamedValue& property, const Property* declared) const {
+const std::string& ObjectWriter::startTag(const NamedValue& property, const Property* declared,
+                                          std::size_t position) const {
+    if (position == startTags.size()) {
+        startTags.emplace_back();
+    }
+    StartTag& tag = startTags[position];
     const Value& value = property.value;
-    const Element element(xml, elementOf(value), [&] {
-        appendAttribute(xml, "NAME", property.name);
-        if (declared != nullptr) {
-            appendAttribute(xml, "CLASSORIGIN", declared->origin);
-        }
-        if (value.type != CMPI_ref) {
-            appendAttribute(xml, "TYPE", xmlType(value.type));
-        }
-        if (value.type == CMPI_instance) {
-            appendAttribute(xml, "EmbeddedObject", "instance");
-        }
-    });
-    appendValue(xml, value);
+    const bool isSame = tag.name == property.name && tag.type == value.type && tag.isArray == value.isArray &&
+                        tag.declared == declared && !tag.xml.empty();
+    if (!isSame) {
+        tag = {property.name, value.type, value.isArray, declared, startTagOf(property, declared)};
+    }
+    return tag.xml;
 }
 
 void ObjectWriter::appendValue(std::string& xml, const Value& value) const {
@@ -173,10 +191,10 @@ void ObjectWriter::appendValue(std::string& xml, const Value& value) const {
         return;
     }
     if (!value.isArray) {
-        return appendScalar(xml, value.elements.empty() ? Scalar{} : value.elements.front());
+        return appendScalar(xml, value.single);
     }
     const Element array(xml, value.type == CMPI_ref ? "VALUE.REFARRAY" : "VALUE.ARRAY");
-    for (const Scalar& each : value.elements) {
+    for (const Scalar& each : value.elements()) {
         if (std::holds_alternative<std::monostate>(each)) {
             const Element null(xml, "VALUE.NULL");
         } else {
@@ -220,7 +238,7 @@ void ObjectWriter::appendInstanceName(std::string& xml, const ObjectPath& path) 
 
 void ObjectWriter::appendKey(std::string& xml, const NamedValue& key) const {
     const Element binding(xml, "KEYBINDING", [&] { appendAttribute(xml, "NAME", key.name); });
-    const Scalar value = key.value.elements.empty() ? Scalar{} : key.value.elements.front();
+    const Scalar& value = key.value.single;
     if (const ObjectPath* path = referenceIn(value)) {
         return appendReference(xml, *path);
     }

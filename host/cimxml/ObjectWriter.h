@@ -28,7 +28,7 @@ struct InstanceParts {
     const Schema* origins = nullptr;  ///< writes the class origin of properties from this schema; null: none
 };
 
-/** Appends CIM objects as CIM-XML elements to a string. */
+/** Appends CIM objects as CIM-XML elements to a string. Not thread-safe. */
 class ObjectWriter {
 public:
     /**
@@ -56,11 +56,23 @@ private:
     void appendLocalNameSpacePath(std::string& xml, const std::string& itsNameSpace) const;
     void appendKey(std::string& xml, const NamedValue& key) const;
     void appendReference(std::string& xml, const ObjectPath& path) const;
-    void appendProperty(std::string& xml, const NamedValue& property, const Property* declared) const;
+    const std::string& startTag(const NamedValue& property, const Property* declared, std::size_t position) const;
     void appendScalar(std::string& xml, const Scalar& scalar) const;
+
+    /** The start tag of a property, and what it depends on. */
+    struct StartTag {
+        std::string name{};
+        CMPIType type = CMPI_null;
+        bool isArray = false;
+        const Property* declared = nullptr;
+        std::string xml{};
+    };
 
     std::string host;
     std::string nameSpace;
+
+    /** By position: the instances of a response usually have the same properties in the same order. */
+    mutable std::vector<StartTag> startTags{};
 };
 
 /** A value of a simple type as its characters, not escaped. */

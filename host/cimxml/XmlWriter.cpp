@@ -1,14 +1,13 @@
 #include "cimxml/XmlWriter.h"
 
+#include <algorithm>
+
 #include "cim/Utf8.h"
 
 namespace cimhost::cimxml {
 namespace {
 
 const char* entityOf(char character) {
-    if (character > '>') {  // letters, which nearly all characters are
-        return nullptr;
-    }
     switch (character) {
         case '&':
             return "&amp;";
@@ -44,15 +43,17 @@ std::size_t plainLength(std::string_view characters) {
 }  // namespace
 
 void appendEscaped(std::string& xml, std::string_view characters) {
-    std::size_t written = 0;
-    for (std::size_t at = 0; at < characters.size(); ++at) {
-        if (const char* entity = entityOf(characters[at])) {
-            xml.append(characters, written, at - written);
-            xml += entity;
-            written = at + 1;
+    while (true) {
+        const auto special = std::find_if(characters.begin(), characters.end(),
+                                          [](char character) { return entityOf(character) != nullptr; });
+        const auto plain = static_cast<std::size_t>(special - characters.begin());
+        xml += characters.substr(0, plain);
+        if (special == characters.end()) {
+            return;
         }
+        xml += entityOf(*special);
+        characters.remove_prefix(plain + 1);
     }
-    xml.append(characters, written, std::string_view::npos);
 }
 
 void appendAttribute(std::string& xml, std::string_view name, std::string_view value) {

@@ -20,6 +20,21 @@ bool isRepresentable(std::string_view characters);
 /** Replaces what XML 1.0 cannot represent by U+FFFD. */
 std::string representable(std::string_view characters);
 
+/** Appends a start tag with the attributes that a function appends. */
+template <class Attributes>
+void appendStartTag(std::string& xml, std::string_view name, Attributes&& attributes) {
+    xml += '<';
+    xml += name;
+    attributes();
+    xml += '>';
+}
+
+inline void appendEndTag(std::string& xml, std::string_view name) {
+    xml += "</";
+    xml += name;
+    xml += '>';
+}
+
 /**
  * An element: writes the start tag, and the end tag when it is destroyed. Elements are never self-closed, since some
  * clients do not understand that.
@@ -27,25 +42,14 @@ std::string representable(std::string_view characters);
 class Element {
 public:
     /** @param itsName a literal: only the reference is kept */
-    Element(std::string& itsXml, std::string_view itsName) : xml(itsXml), name(itsName) {
-        xml += '<';
-        xml += name;
-        xml += '>';
-    }
+    Element(std::string& itsXml, std::string_view itsName) : Element(itsXml, itsName, [] {}) {}
 
     /** An element with attributes, which a function appends. */
     template <class Attributes>
     Element(std::string& itsXml, std::string_view itsName, Attributes&& attributes) : xml(itsXml), name(itsName) {
-        xml += '<';
-        xml += name;
-        attributes();
-        xml += '>';
+        appendStartTag(xml, name, attributes);
     }
-    ~Element() {
-        xml += "</";
-        xml += name;
-        xml += '>';
-    }
+    ~Element() { appendEndTag(xml, name); }
     Element(const Element&) = delete;
     Element& operator=(const Element&) = delete;
 

@@ -35,14 +35,14 @@ struct ScalarJson {
 };
 
 Json contentJson(const Value& value) {
-    if (value.isNull || (!value.isArray && value.elements.empty())) {
+    if (value.isNull) {
         return nullptr;
     }
     if (!value.isArray) {
-        return std::visit(ScalarJson{}, value.elements.front());
+        return std::visit(ScalarJson{}, value.single);
     }
     Json list = Json::array();
-    for (const Scalar& element : value.elements) {
+    for (const Scalar& element : value.elements()) {
         list.push_back(std::visit(ScalarJson{}, element));
     }
     return list;
@@ -86,6 +86,10 @@ Json stringOrNull(const std::string& string) {
 }
 
 struct EventJson {
+    template <class Kind>
+    Json operator()(const std::shared_ptr<Kind>& shared) const {
+        return (*this)(*shared);
+    }
     Json operator()(const Instance& instance) const {
         return {{"kind", "instance"}, {"instance", instanceJson(instance)}};
     }

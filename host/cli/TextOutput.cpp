@@ -7,8 +7,8 @@ namespace cimhost::text {
 namespace {
 
 std::string valueText(const Value& value) {
-    if (value.type == CMPI_ref && !value.isArray && !value.isNull && !value.elements.empty()) {
-        const auto* path = std::get_if<std::shared_ptr<const ObjectPath>>(&value.elements.front());
+    if (value.type == CMPI_ref && !value.isArray) {
+        const auto* path = std::get_if<std::shared_ptr<const ObjectPath>>(&value.single);
         if (path != nullptr && *path != nullptr) {
             return formatObjectPath(**path);
         }
@@ -29,6 +29,10 @@ std::string instanceText(const Instance& instance, const std::string& indent, co
 struct EventText {
     const Style& style;
 
+    template <class Kind>
+    std::string operator()(const std::shared_ptr<Kind>& shared) const {
+        return (*this)(*shared);
+    }
     std::string operator()(const Instance& instance) const {
         return "instance " + instanceText(instance, "   ", style);
     }

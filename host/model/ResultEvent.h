@@ -3,8 +3,10 @@
 #include <cmpidt.h>
 
 #include <algorithm>
+#include <memory>
 #include <optional>
 #include <string>
+#include <type_traits>
 #include <variant>
 #include <vector>
 
@@ -37,18 +39,47 @@ struct Done {};
 /** A null pointer that a provider returned as an instance, an object path or an error. The result rejects it. */
 struct NullResult {};
 
-/** One call of a result function: an instance, an object path, data, an error or null was returned, or returnDone. */
-using ResultEvent = std::variant<Instance, ObjectPath, Value, ErrorInfo, NullResult, Done>;
+/**
+ * One call of a result function: an instance, an object path, data, an error or null was returned, or returnDone. An
+ * instance that only the event refers to may be changed.
+ */
+using ResultEvent =
+    std::variant<std::shared_ptr<Instance>, ObjectPath, Value, std::shared_ptr<const ErrorInfo>, NullResult, Done>;
 
-/** The results of a provider, in order. Each is a copy made at the time of the call. */
+/** The results of a provider, in order, as they were at the time of the call. */
 using ResultEvents = std::vector<ResultEvent>;
+
+/** The alternative of ResultEvent for a result of this kind. */
+template <class Kind>
+struct AlternativeFor {
+    using Type = Kind;
+};
+template <>
+struct AlternativeFor<Instance> {
+    using Type = std::shared_ptr<Instance>;
+};
+template <>
+struct AlternativeFor<ErrorInfo> {
+    using Type = std::shared_ptr<const ErrorInfo>;
+};
+
+/** The result of an event; null if it is of another kind. */
+template <class Kind>
+const Kind* resultOf(const ResultEvent& event) {
+    const auto* alternative = std::get_if<typename AlternativeFor<Kind>::Type>(&event);
+    if constexpr (std::is_same_v<typename AlternativeFor<Kind>::Type, Kind>) {
+        return alternative;
+    } else {
+        return alternative == nullptr ? nullptr : alternative->get();
+    }
+}
 
 /** All events of one kind, in order. */
 template <class Kind>
 std::vector<Kind> eventsOf(const ResultEvents& events) {
     std::vector<Kind> found;
     for (const ResultEvent& event : events) {
-        if (const Kind* one = std::get_if<Kind>(&event)) {
+        if (const Kind* one = resultOf<Kind>(event)) {
             found.push_back(*one);
         }
     }

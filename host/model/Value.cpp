@@ -64,33 +64,28 @@ Value Value::of(Scalar scalar) {
 }
 
 Value Value::of(CMPIType type, Scalar scalar) {
-    if (std::holds_alternative<std::monostate>(scalar)) {
-        return null(type);
-    }
-    Value value{type, false, false, {}};
-    value.elements.push_back(std::move(scalar));  // An initializer list would copy it.
-    return value;
+    const bool isNull = std::holds_alternative<std::monostate>(scalar);
+    return {type, false, isNull, false, std::move(scalar), {}};
 }
 
-Value Value::array(CMPIType type, std::vector<Scalar> elements) {
-    return {type, true, false, std::move(elements)};
+Value Value::array(CMPIType type, std::vector<Scalar> items) {
+    return {type, true, false, false, {}, std::move(items)};
 }
 
 Value Value::null(CMPIType type, bool isArray) {
-    return {type, isArray, true, {}};
+    return {type, isArray, true};
 }
 
 Value Value::stringWithoutCharacters() {
-    return {CMPI_string, false, false, {std::monostate{}}};
+    return {CMPI_string, false, false, true};
 }
 
 Value Value::nullStringObject() {
-    return {CMPI_string, false, true, {std::monostate{}}};
+    return {CMPI_string, false, true, true};
 }
 
-bool Value::isStringWithoutCharacters() const {
-    return type == CMPI_string && !isArray && elements.size() == 1 &&
-           std::holds_alternative<std::monostate>(elements.front());
+ScalarRange Value::elements() const {
+    return isArray ? ScalarRange{items.data(), items.size()} : ScalarRange{&single, isNull ? 0U : 1U};
 }
 
 }  // namespace cimhost

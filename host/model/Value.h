@@ -8,6 +8,7 @@
 #include <optional>
 #include <string>
 #include <string_view>
+#include <utility>
 #include <variant>
 #include <vector>
 
@@ -48,12 +49,30 @@ inline bool isInteger(CMPIType type) {
     return (type & CMPI_INTEGER) != 0 && (type & CMPI_ENC) == 0;
 }
 
-/** A CIM value, also null, with its declared type. */
+/** Consecutive scalars of a value, which must outlive the range. */
+struct ScalarRange {
+    const Scalar* first;
+    std::size_t count;
+
+    const Scalar* begin() const { return first; }
+    const Scalar* end() const { return first + count; }
+    std::size_t size() const { return count; }
+    bool empty() const { return count == 0; }
+    const Scalar& front() const { return *first; }
+    const Scalar& operator[](std::size_t index) const { return first[index]; }
+};
+
+/** A CIM value, also null, with its declared type. A value that is not an array needs no allocation of its own. */
 struct Value {
-    CMPIType type = CMPI_null;       ///< element type, without CMPI_ARRAY
-    bool isArray = false;            ///< whether it is an array of that type
-    bool isNull = true;              ///< whether the value, or the array, is null
-    std::vector<Scalar> elements{};  ///< one element unless an array; none when null
+    CMPIType type = CMPI_null;     ///< element type, without CMPI_ARRAY
+    bool isArray = false;          ///< whether it is an array of that type
+    bool isNull = true;            ///< whether the value, or the array, is null
+    bool lacksCharacters = false;  ///< a string object whose character pointer is null
+    Scalar single{};               ///< the value unless an array; std::monostate when null
+    std::vector<Scalar> items{};   ///< the elements of an array; none when null
+
+    /** The elements of an array, or the single value; none when null. */
+    ScalarRange elements() const;
 
     /** A single value of the scalar's own type. */
     static Value of(Scalar scalar);
@@ -64,25 +83,28 @@ struct Value {
 
     /** A single value of a declared type; null if the scalar is null. */
     static Value of(CMPIType type, Scalar scalar);
-    static Value array(CMPIType type, std::vector<Scalar> elements);
+    static Value array(CMPIType type, std::vector<Scalar> items);
 
     static Value null(CMPIType type, bool isArray = false);
 
     /** @name Strings without characters
      * Some object managers pass string objects whose character pointer is null. The data of nullStringObject() also has
-     * the state CMPI_nullValue. Both values have one element, which is null.
+     * the state CMPI_nullValue.
      */
     ///@{
     static Value stringWithoutCharacters();
     static Value nullStringObject();
-    bool isStringWithoutCharacters() const;
     ///@}
 };
 
 /** A named value: a key of an object path or a property of an instance. */
 struct NamedValue {
-    std::string name;
-    Value value;
+    NamedValue() = default;
+    NamedValue(std::string itsName, Value&& itsValue) : name(std::move(itsName)), value(std::move(itsValue)) {}
+    NamedValue(std::string itsName, const Value& itsValue) : name(std::move(itsName)), value(itsValue) {}
+
+    std::string name{};
+    Value value{};
 };
 
 /** Identity of a CIM instance, or of a class when it has no keys. */

@@ -33,7 +33,7 @@ StatusOr<ObjectPath> ManagerBehaviour::createdPath(const ProviderResponse& respo
         if (const auto* path = std::get_if<ObjectPath>(&event)) {
             return {{}, *path};
         }
-        if (const auto* instance = std::get_if<Instance>(&event)) {
+        if (const auto* instance = resultOf<Instance>(event)) {
             return {{}, instance->path};
         }
     }

@@ -1,6 +1,7 @@
 #include "operations/ResponseMapping.h"
 
 #include <algorithm>
+#include <memory>
 #include <utility>
 
 #include "schema/ObjectPathText.h"
@@ -30,8 +31,16 @@ constexpr const char* kindName<ObjectPath> = "object path";
 /** Whether an event is of this kind or of one that every operation may have. */
 template <class Kind>
 bool isExpected(const ResultEvent& event) {
-    return std::holds_alternative<Kind>(event) || std::holds_alternative<Done>(event) ||
-           std::holds_alternative<ErrorInfo>(event) || std::holds_alternative<NullResult>(event);
+    return resultOf<Kind>(event) != nullptr || std::holds_alternative<Done>(event) ||
+           resultOf<ErrorInfo>(event) != nullptr || std::holds_alternative<NullResult>(event);
+}
+
+/** The result of an event, which it leaves unless it is kept or shared. */
+ObjectPath takeResult(ObjectPath& path, bool keeps) {
+    return keeps ? path : std::move(path);
+}
+Instance takeResult(std::shared_ptr<Instance>& instance, bool keeps) {
+    return keeps || instance.use_count() > 1 ? *instance : std::move(*instance);
 }
 
 /** Appends all results of this kind; an error if there are others. They leave the events, unless these are kept. */
@@ -46,8 +55,8 @@ Status collect(std::vector<ProviderResponse>& responses, Operation operation, bo
         }
         results.reserve(results.size() + response.events.size());
         for (ResultEvent& event : response.events) {
-            if (Kind* one = std::get_if<Kind>(&event)) {
-                results.push_back(keepsEvents ? Kind(*one) : std::move(*one));
+            if (auto* one = std::get_if<typename AlternativeFor<Kind>::Type>(&event)) {
+                results.push_back(takeResult(*one, keepsEvents));
             }
         }
     }

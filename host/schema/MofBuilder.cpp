@@ -249,7 +249,7 @@ Value MofBuilder::readValue(const Node& initializer, const Property& type) const
     }
     Value value = Value::array(type.type, {});
     for (const Node* constant : children<mof::Constant>(initializer)) {
-        value.elements.push_back(readElement(*constant, type));
+        value.items.push_back(readElement(*constant, type));
     }
     return value;
 }

@@ -100,15 +100,15 @@ struct ScalarFormat {
 };
 
 std::string formatValue(const Value& value, Quote quote) {
-    if (value.isNull || (!value.isArray && value.elements.empty())) {
+    if (value.isNull) {
         return "NULL";
     }
     const ScalarFormat scalar{quote};
     if (!value.isArray) {
-        return std::visit(scalar, value.elements.front());
+        return std::visit(scalar, value.single);
     }
     std::string list = "{";
-    for (const Scalar& element : value.elements) {
+    for (const Scalar& element : value.elements()) {
         list += (list.size() > 1 ? ", " : "") + std::visit(scalar, element);
     }
     return list + "}";

@@ -47,7 +47,7 @@ Value parseArray(std::string_view source, const Property& property, const Schema
             peg::parse_tree::parse<mof::LoneArray, grammar::Node, mof::Selected, peg::nothing, mof::Control>(input);
         Value value = Value::array(property.type, {});
         for (const grammar::Node* constant : grammar::children<mof::Constant>(*root->children.front())) {
-            value.elements.push_back(typedElement(constantLiteral(*constant), property, schema, defaultNameSpace));
+            value.items.push_back(typedElement(constantLiteral(*constant), property, schema, defaultNameSpace));
         }
         return value;
     } catch (const peg::parse_error& error) {

@@ -12,7 +12,7 @@ bool isTrue(const Qualifier* qualifier) {
     if (qualifier == nullptr || qualifier->value.isNull) {
         return false;
     }
-    const bool* value = std::get_if<bool>(&qualifier->value.elements.front());
+    const bool* value = std::get_if<bool>(&qualifier->value.single);
     return value != nullptr && *value;
 }
 

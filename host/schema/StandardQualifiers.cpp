@@ -76,8 +76,7 @@ QualifierDeclaration declaration(const Row& row) {
     QualifierDeclaration declared{row.name,   row.type, row.isArray, Value::null(row.type, row.isArray),
                                   row.flavor, true};
     if (row.type == CMPI_boolean) {
-        declared.defaultValue.isNull = false;
-        declared.defaultValue.elements = {false};
+        declared.defaultValue = Value::of(false);
     }
     return declared;
 }

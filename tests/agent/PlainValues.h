@@ -10,7 +10,7 @@ namespace agent_test {
 /** Returns a plain value of a CIM type, such as plain(CMPI_uint32, std::uint32_t{7}). */
 template <typename Element>
 cimhost::Value plain(CMPIType type, Element element) {
-    return {type, false, false, {cimhost::Scalar(std::move(element))}};
+    return cimhost::Value::of(type, cimhost::Scalar(std::move(element)));
 }
 
 inline cimhost::Value text(std::string value) {
@@ -27,7 +27,7 @@ inline cimhost::Value nullOf(CMPIType type) {
 
 /** Returns the string of a string value; otherwise a string that no test expects. */
 inline std::string textIn(const cimhost::Value& value) {
-    const std::string* found = value.elements.empty() ? nullptr : std::get_if<std::string>(&value.elements.front());
+    const std::string* found = std::get_if<std::string>(&value.single);
     return found != nullptr ? *found : "(no text)";
 }
 

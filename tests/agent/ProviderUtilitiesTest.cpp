@@ -39,7 +39,7 @@ protected:
 
     Instance valueOf(const CMPIInstance* object) {
         result->ft->returnInstance(result, object);
-        return std::get<Instance>(events.back());
+        return *cimhost::resultOf<Instance>(events.back());
     }
 
     /** Returns the only property of an instance after it was set. */
@@ -150,9 +150,9 @@ TEST_F(ProviderUtilitiesTest, SetPropertiesOfEveryType) {
     const std::vector<NamedValue> properties = valueOf(object).properties;
     ASSERT_EQ(properties.size(), 6U);
     EXPECT_EQ(textIn(properties[0].value), "Example");
-    EXPECT_EQ(std::get<std::uint16_t>(properties[1].value.elements.front()), 65535);
-    EXPECT_EQ(std::get<std::uint32_t>(properties[2].value.elements.front()), 4294967295U);
-    EXPECT_TRUE(std::get<bool>(properties[3].value.elements.front()));
+    EXPECT_EQ(std::get<std::uint16_t>(properties[1].value.single), 65535);
+    EXPECT_EQ(std::get<std::uint32_t>(properties[2].value.single), 4294967295U);
+    EXPECT_TRUE(std::get<bool>(properties[3].value.single));
     EXPECT_EQ(properties[4].value.type, CMPI_ref);
     EXPECT_EQ(textIn(properties[5].value), "Example");
 }
@@ -164,7 +164,7 @@ TEST_F(ProviderUtilitiesTest, SetDateTimesFromStrings) {
         const cimhost::Value value = onlyProperty(object);
         EXPECT_EQ(value.type, CMPI_dateTime);
         ASSERT_FALSE(value.isNull) << date;
-        EXPECT_EQ(std::get<cimhost::DateTime>(value.elements.front()).value, date);
+        EXPECT_EQ(std::get<cimhost::DateTime>(value.single).value, date);
     }
 }
 

@@ -148,7 +148,7 @@ const cimhost::Schema& schema() {
 
 bool isWritable(const cimhost::Property& property) {
     const cimhost::Qualifier* write = property.findQualifier("Write");
-    return write != nullptr && std::get<bool>(write->value.elements.at(0));
+    return write != nullptr && std::get<bool>(write->value.single);
 }
 
 /** Returns a unique value for a property that differs from the test data. */

@@ -48,8 +48,8 @@ bool isPartOf(const ResultEvent& event, const ResultEvent& whole) {
         const auto* wholePath = std::get_if<ObjectPath>(&whole);
         return wholePath != nullptr && isPartOf(*path, *wholePath);
     }
-    const auto* instance = std::get_if<Instance>(&event);
-    const auto* wholeInstance = std::get_if<Instance>(&whole);
+    const auto* instance = cimhost::resultOf<Instance>(event);
+    const auto* wholeInstance = cimhost::resultOf<Instance>(whole);
     return instance != nullptr && wholeInstance != nullptr && isPartOf(instance->path, wholeInstance->path) &&
            isPartOf(instance->properties, wholeInstance->properties);
 }

@@ -29,8 +29,8 @@ std::string contentOf(const std::string& name) {
 }
 
 std::string formatted(const cimhost::Value& value) {
-    if (!value.isNull && value.elements.size() == 1) {
-        const cimhost::Scalar& only = value.elements.front();
+    if (!value.isNull && value.elements().size() == 1) {
+        const cimhost::Scalar& only = value.single;
         if (const auto* characters = std::get_if<std::string>(&only)) {
             return *characters;
         }

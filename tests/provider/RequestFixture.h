@@ -20,7 +20,7 @@ using KO::LeaseWarrantyProvider::WarrantyBase;
 using KO::LeaseWarrantyProvider::WarrantyUnit;
 
 inline cimhost::NamedValue textKey(const std::string& name, const std::string& text) {
-    return {name, {CMPI_string, false, false, {text}}};
+    return {name, cimhost::Value::of(text)};
 }
 
 /** Makes requests like an object manager. Tests can access the provider's tables, which are empty at first. */

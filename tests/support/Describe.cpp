@@ -50,7 +50,7 @@ void Description::add(const CMPIObjectPath* path) {
 
 void Description::add(const CMPIInstance* instance) {
     strings.push_back(
-        describeContent(instance, [](const auto& content) { return formatObjectPath(content.value.path); }));
+        describeContent(instance, [](const auto& content) { return formatObjectPath(content.value->path); }));
 }
 
 void Description::add(const CMPIString* string) {

@@ -187,7 +187,7 @@ CMPIObjectPath* RecordingBroker::objectPath(const cimhost::ObjectPath& path) {
 }
 
 CMPIInstance* RecordingBroker::instance(const cimhost::Instance& instance) {
-    return state->objects.make<CMPIInstance>({instance, nullptr, {}});
+    return state->objects.make<CMPIInstance>({cimhost::SharedInstance(instance)});
 }
 
 void RecordingBroker::emulate(Manager manager) {

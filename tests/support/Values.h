@@ -48,8 +48,8 @@ template <class Type>
 std::optional<Type> valueOf(const std::vector<cimhost::NamedValue>& values, const std::string& name) {
     const cimhost::Value* value = find(values, name);
     const bool exists =
-        value != nullptr && !value->isNull && !value->isArray && std::holds_alternative<Type>(value->elements.front());
-    return exists ? std::optional<Type>(std::get<Type>(value->elements.front())) : std::nullopt;
+        value != nullptr && !value->isNull && !value->isArray && std::holds_alternative<Type>(value->single);
+    return exists ? std::optional<Type>(std::get<Type>(value->single)) : std::nullopt;
 }
 
 std::optional<std::string> stringOf(const std::vector<cimhost::NamedValue>& values, const std::string& name);

@@ -7,6 +7,7 @@ using cimhost::ErrorInfo;
 using cimhost::eventsOf;
 using cimhost::Instance;
 using cimhost::ObjectPath;
+using cimhost::resultOf;
 using cimhost::Value;
 
 class ResultTest : public BrokerTest {
@@ -30,9 +31,9 @@ TEST_F(ResultTest, CollectsEverythingInOrder) {
     result->ft->returnDone(result);
     ASSERT_EQ(events.size(), 6U);
     EXPECT_EQ(std::get<ObjectPath>(events[0]).className, "P");
-    EXPECT_EQ(std::get<Instance>(events[1]).path.className, "I");
-    EXPECT_EQ(std::get<std::uint32_t>(std::get<Value>(events[2]).elements.front()), 7U);
-    EXPECT_EQ(std::get<ErrorInfo>(events[3]).message, "It broke");
+    EXPECT_EQ(resultOf<Instance>(events[1])->path.className, "I");
+    EXPECT_EQ(std::get<std::uint32_t>(std::get<Value>(events[2]).single), 7U);
+    EXPECT_EQ(resultOf<ErrorInfo>(events[3])->message, "It broke");
     EXPECT_EQ(cimhost::doneCount(events), 2);
 }
 

@@ -135,12 +135,12 @@ TEST_F(InstanceOperationsTest, CreationReadsValuesWithTheTypesOfTheClass) {
     ASSERT_EQ(sent.path.keys.size(), 1U);
     EXPECT_EQ(sent.path.keys[0].name, "Name");
     ASSERT_EQ(sent.instance.properties.size(), 5U);
-    EXPECT_EQ(std::get<std::string>(sent.instance.properties[0].value.elements[0]), "\xC3\xA4");
-    EXPECT_EQ(std::get<std::uint32_t>(sent.instance.properties[1].value.elements[0]), 31U);
-    EXPECT_TRUE(std::get<bool>(sent.instance.properties[2].value.elements[0]));
+    EXPECT_EQ(std::get<std::string>(sent.instance.properties[0].value.single), "\xC3\xA4");
+    EXPECT_EQ(std::get<std::uint32_t>(sent.instance.properties[1].value.single), 31U);
+    EXPECT_TRUE(std::get<bool>(sent.instance.properties[2].value.single));
     EXPECT_TRUE(sent.instance.properties[3].value.isNull);
     EXPECT_EQ(sent.instance.properties[3].value.type, CMPI_dateTime);
-    EXPECT_EQ(sent.instance.properties[4].value.elements.size(), 2U);
+    EXPECT_EQ(sent.instance.properties[4].value.elements().size(), 2U);
 }
 
 TEST_F(InstanceOperationsTest, WrongValuesAreRefusedBeforeTheProvider) {
@@ -174,7 +174,7 @@ TEST_F(InstanceOperationsTest, ModificationPassesPropertiesAndList) {
     EXPECT_EQ(statusOf(result), 0);
     EXPECT_EQ(result.child("IRETURNVALUE"), nullptr);
     const Request& sent = manager.requests.at(0);
-    EXPECT_EQ(std::get<std::string>(sent.path.keys.at(0).value.elements.at(0)), "a");
+    EXPECT_EQ(std::get<std::string>(sent.path.keys.at(0).value.single), "a");
     EXPECT_EQ(sent.instance.properties.size(), 1U);
     EXPECT_THAT(*sent.properties, ElementsAre("Size"));
 }

@@ -106,7 +106,7 @@ TEST_F(MessageTest, WritingNeedsTheRight) {
     const Request& last = manager.requests.back();
     ASSERT_EQ(last.context.size(), 1U);
     EXPECT_EQ(last.context[0].name, "CMPIPrincipal");
-    EXPECT_EQ(std::get<std::string>(last.context[0].value.elements[0]), "writer");
+    EXPECT_EQ(std::get<std::string>(last.context[0].value.single), "writer");
 }
 
 TEST_F(MessageTest, UnknownNamespacesAndParametersAreRefused) {

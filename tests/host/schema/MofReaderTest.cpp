@@ -94,11 +94,11 @@ TEST(MofReader, ReadsCharactersDateTimesAndNull) {
 
 TEST(MofReader, ReadsArrays) {
     const Value numbers = defaultOf("uint16 X[3] = {1, 0x2, null};");
-    ASSERT_EQ(numbers.elements.size(), 3U);
-    EXPECT_EQ(std::get<std::uint16_t>(numbers.elements[1]), 2);
-    EXPECT_TRUE(std::holds_alternative<std::monostate>(numbers.elements[2]));
+    ASSERT_EQ(numbers.elements().size(), 3U);
+    EXPECT_EQ(std::get<std::uint16_t>(numbers.elements()[1]), 2);
+    EXPECT_TRUE(std::holds_alternative<std::monostate>(numbers.elements()[2]));
     const Value none = defaultOf("string X[] = {};");
-    EXPECT_TRUE(none.elements.empty());
+    EXPECT_TRUE(none.elements().empty());
     EXPECT_FALSE(none.isNull);
     EXPECT_TRUE(defaultOf("string X[] = null;").isNull);
     EXPECT_TRUE(defaultOf("string X[] = null;").isArray);

@@ -69,7 +69,7 @@ TEST(MofWriter, ALongStringIsSeveralLiteralsAndIsReadBack) {
     EXPECT_GT(literals, 5U);
     Schema schema;
     MofReader(schema).readSource("class C { string A; }; " + written, "long text");
-    EXPECT_EQ(std::get<std::string>(schema.instances().front().properties.front().value.elements.front()), text);
+    EXPECT_EQ(std::get<std::string>(schema.instances().front().properties.front().value.single), text);
 }
 
 TEST(MofWriter, AShortStringIsOneLiteral) {
@@ -98,8 +98,8 @@ TEST(MofWriter, TheLargestRealNumbersAreReadBack) {
     const std::string written = formatMof(schema.instances().front());
     MofReader(schema).readSource(written, "again");
     const auto& again = schema.instances().back().properties;
-    EXPECT_EQ(std::get<float>(again[0].value.elements[0]), -std::numeric_limits<float>::max());
-    EXPECT_EQ(std::get<double>(again[1].value.elements[0]), std::numeric_limits<double>::max());
+    EXPECT_EQ(std::get<float>(again[0].value.single), -std::numeric_limits<float>::max());
+    EXPECT_EQ(std::get<double>(again[1].value.single), std::numeric_limits<double>::max());
 }
 
 TEST(MofWriter, EmbedsAnInstanceAsAString) {

@@ -39,7 +39,7 @@ inline std::string described(const Value& value) {
 /** The single element of a value, as the C++ type of its CIM type. */
 template <typename Element>
 Element element(const Value& value) {
-    return std::get<Element>(value.elements.at(0));
+    return std::get<Element>(value.single);
 }
 
 /** A temporary directory, which the destructor removes. */

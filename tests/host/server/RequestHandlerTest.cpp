@@ -25,7 +25,7 @@ public:
 class FakeManager : public UpCalls {
 public:
     Response perform(Request request) override {
-        principal = std::get<std::string>(request.context.at(0).value.elements.at(0));
+        principal = std::get<std::string>(request.context.at(0).value.single);
         return {};
     }
     std::string principal{};

@@ -30,12 +30,17 @@ void trim(std::string& string, const std::function<bool(char)>& isRemoved) {
     string.erase(string.begin(), std::find_if_not(string.begin(), string.end(), isRemoved));
 }
 
+void trim(Scalar& scalar, const std::function<bool(char)>& isRemoved) {
+    if (auto* string = std::get_if<std::string>(&scalar)) {
+        trim(*string, isRemoved);
+    }
+}
+
 void trim(std::vector<NamedValue>& values, const std::function<bool(char)>& isRemoved) {
     for (NamedValue& each : values) {
-        for (Scalar& element : each.value.elements) {
-            if (auto* string = std::get_if<std::string>(&element)) {
-                trim(*string, isRemoved);
-            }
+        trim(each.value.single, isRemoved);
+        for (Scalar& item : each.value.items) {
+            trim(item, isRemoved);
         }
     }
 }

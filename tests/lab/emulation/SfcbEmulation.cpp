@@ -33,7 +33,7 @@ std::size_t xmlSize(const std::vector<NamedValue>& values) {
     std::size_t size = 0;
     for (const NamedValue& each : values) {
         size += markup + each.name.size();
-        for (const Scalar& element : each.value.elements) {
+        for (const Scalar& element : each.value.elements()) {
             size += xmlSize(element);
         }
     }
@@ -46,7 +46,7 @@ std::size_t xmlSize(const ResultEvents& events) {
     for (const ResultEvent& event : events) {
         if (const auto* path = std::get_if<ObjectPath>(&event)) {
             size += xmlSize(*path);
-        } else if (const auto* instance = std::get_if<Instance>(&event)) {
+        } else if (const auto* instance = resultOf<Instance>(event)) {
             size += xmlSize(instance->path) + xmlSize(instance->properties);
         }
     }
@@ -55,7 +55,7 @@ std::size_t xmlSize(const ResultEvents& events) {
 
 bool returnedObject(const ProviderResponse& response) {
     return std::any_of(response.events.begin(), response.events.end(), [](const ResultEvent& event) {
-        return std::holds_alternative<Instance>(event) || std::holds_alternative<ObjectPath>(event);
+        return resultOf<Instance>(event) != nullptr || std::holds_alternative<ObjectPath>(event);
     });
 }
 
@@ -157,9 +157,9 @@ public:
     /** An instance is misread as a path, with the namespace as its class. */
     StatusOr<ObjectPath> createdPath(const ProviderResponse& response) const override {
         const auto first = std::find_if(response.events.begin(), response.events.end(), [](const ResultEvent& each) {
-            return std::holds_alternative<Instance>(each) || std::holds_alternative<ObjectPath>(each);
+            return resultOf<Instance>(each) != nullptr || std::holds_alternative<ObjectPath>(each);
         });
-        const auto* instance = first == response.events.end() ? nullptr : std::get_if<Instance>(&*first);
+        const auto* instance = first == response.events.end() ? nullptr : resultOf<Instance>(*first);
         return instance == nullptr
                    ? ManagerBehaviour::createdPath(response)
                    : StatusOr<ObjectPath>{{}, {{}, instance->path.nameSpace, instance->path.nameSpace, {}}};

@@ -68,10 +68,10 @@ Status refused(const std::string& name, const char* why) {
 Status convert(NamedValue& sent, const PropertyInfo& property) {
     const IntegerType* target = integerType(property.type);
     const bool isConvertible = target != nullptr && !sent.value.isArray && !property.isArray;
-    if (!isConvertible || sent.value.elements.size() != 1) {
+    if (!isConvertible || sent.value.elements().size() != 1) {
         return refused(sent.name, "has another type.");
     }
-    std::optional<Scalar> number = converted(sent.value.elements.front(), *target);
+    std::optional<Scalar> number = converted(sent.value.single, *target);
     if (!number) {
         return refused(sent.name, "has a value that does not fit its type.");
     }
@@ -80,7 +80,7 @@ Status convert(NamedValue& sent, const PropertyInfo& property) {
 }
 
 bool hasInvalidDateTime(const Value& value) {
-    return std::any_of(value.elements.begin(), value.elements.end(), [](const Scalar& each) {
+    return std::any_of(value.elements().begin(), value.elements().end(), [](const Scalar& each) {
         const auto* date = std::get_if<DateTime>(&each);
         return date != nullptr && !cim::isDateTime(date->value);
     });

@@ -15,9 +15,8 @@ ObjectPath LoadClass::instancePath(const std::string& id) const {
 std::optional<std::string> LoadClass::idIn(const std::vector<NamedValue>& values) const {
     const NamedValue* found = findNamed(values, key);
     const bool isText = found != nullptr && !found->value.isNull && !found->value.isArray &&
-                        !found->value.elements.empty() &&
-                        std::holds_alternative<std::string>(found->value.elements.front());
-    return isText ? std::optional(std::get<std::string>(found->value.elements.front())) : std::nullopt;
+                        !found->value.elements().empty() && std::holds_alternative<std::string>(found->value.single);
+    return isText ? std::optional(std::get<std::string>(found->value.single)) : std::nullopt;
 }
 
 LoadClass loadClass(const Schema& schema, const ObjectPath& path) {

@@ -48,7 +48,7 @@ protected:
                 testsupport::named("A property " + std::to_string(property), text("A value")));
         }
         cimhost::ProviderResponse response;
-        response.events.assign(instances, instance);
+        response.events.assign(instances, std::make_shared<cimhost::Instance>(instance));
         return cimhost::lab::emulationOf(which)->statusOf(response, Operation::enumerateInstances);
     }
 };

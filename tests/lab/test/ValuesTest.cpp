@@ -55,7 +55,7 @@ TEST(MadeValues, DatesExist) {
     Random random(1, 1);
     for (int i = 0; i < 1000; ++i) {
         const Value value = makeValue(property(CMPI_dateTime), random);
-        EXPECT_TRUE(cim::isDateTime(std::get<cimhost::DateTime>(value.elements.front()).value));
+        EXPECT_TRUE(cim::isDateTime(std::get<cimhost::DateTime>(value.single).value));
     }
 }
 
