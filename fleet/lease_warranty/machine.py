@@ -14,7 +14,7 @@ OMITTED = {"Caption", "Description", "ElementName", "AssetIDStringArea", "LocalD
 
 
 def value_of(name, described, place):
-    """A value as JSON has it: dates in the form of ISO 8601. None if it is not given."""
+    """Returns a value for the JSON document: datetimes in ISO 8601 form. None if the value is not given."""
     value = described["value"]
     if described["type"] == "datetime" and value is not None:
         try:
