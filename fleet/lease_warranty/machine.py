@@ -47,7 +47,7 @@ def single(class_name):
 
 
 def checked_instances(kind, directory, files):
-    """The leases or the warranties, if they are those of the file."""
+    """Returns the leases or the warranties; they must be those of the file."""
     path = directory / kind.file
     found = instances(kind.class_name)
     identifiers = [each["path"]["keys"]["InstanceID"]["value"] for each in found]
