@@ -48,8 +48,8 @@ unsigned short classIdOf(const CallSite& site, Class requestedClass) {
 }
 
 /**
- * Returns the namespace of a path; empty on failure. The object manager writes the status that the entry point returns
- * directly, since an exception may follow. ProviderUtilities::getNamespace returns no status.
+ * Returns the namespace of a path; empty on failure. The status is that of the entry point, so that it is also returned
+ * if an exception follows. ProviderUtilities::getNamespace returns no status.
  */
 std::string nameSpaceOf(const CMPIObjectPath* path, CMPIStatus& status) {
     if (path == nullptr) {

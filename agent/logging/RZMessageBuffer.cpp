@@ -28,7 +28,7 @@ protected:
 };
 
 /**
- * Implementations for reuse. Has no lock and no thread-local data: destructors of the latter would keep the library
+ * Implementations that no buffer uses. Has no lock, and no thread-local data, whose destructors would keep the library
  * from being unloaded.
  */
 template <typename Element, std::size_t Size>

@@ -1,4 +1,4 @@
-"""Leases and warranties: where each has its party, start and term, and how its data file is divided."""
+"""Leases and warranties: the properties with their party, start and term, and the layout of their data files."""
 
 import collections
 

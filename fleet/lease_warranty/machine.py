@@ -14,7 +14,7 @@ OMITTED = {"Caption", "Description", "ElementName", "AssetIDStringArea", "LocalD
 
 
 def value_of(name, described, place):
-    """A value as JSON has it: dates in the form of ISO 8601. None if it is not given."""
+    """Returns a value for the JSON document: datetimes in ISO 8601 form. None if the value is not given."""
     value = described["value"]
     if described["type"] == "datetime" and value is not None:
         try:
@@ -47,7 +47,7 @@ def single(class_name):
 
 
 def checked_instances(kind, directory, files):
-    """The leases or the warranties, if they are those of the file."""
+    """Returns the leases or the warranties; they must be those of the file."""
     path = directory / kind.file
     found = instances(kind.class_name)
     identifiers = [each["path"]["keys"]["InstanceID"]["value"] for each in found]

@@ -175,8 +175,8 @@ sfcb_setting() { # NAME
     [ -r "$sfcb_config" ] && sed -n "s/^[[:space:]]*$1:[[:space:]]*//p" "$sfcb_config" | tail -n 1
 }
 
-# Warns if SFCB may not find the library. It looks it up by its name in the directories that the configuration lists,
-# by default in cmpi below the directory of SFCB's libraries, among others.
+# Warns if SFCB may not find the library. SFCB searches the directories in its configuration, by default among others
+# cmpi below the directory of its libraries.
 sfcb_check_library() {
     directories=$(sfcb_setting providerDirs) || {
         say "SFCB may not find the library: $sfcb_config cannot be read; its line providerDirs must contain $libraries"

@@ -22,7 +22,7 @@ constexpr CMPIrc brokerCode = CMPI_RC_ERR_ACCESS_DENIED;
 
 class BrokerFailureTest : public RecordTest {
 protected:
-    /** Lets a call fail, or return null with the status OK. */
+    /** Makes a call fail, or return null with the status OK. */
     void failOneCall(const std::string& function, int number, bool isSilent) {
         if (isSilent) {
             broker.answerNothing(function, number);

@@ -68,8 +68,8 @@ ssize_t writev(int descriptor, const struct iovec* parts, int count) {
 }
 
 /**
- * Defines another function for an open file that makes the system call with that number. The function has a different
- * name in this source, so that it need not match the C library's declaration.
+ * Defines a replacement of a C library function for open files, which counts calls and makes the system call with that
+ * number. It has a different name in this source, so that it need not match the C library's declaration.
  */
 #define COUNTED(name, number)                                                                             \
     long counted_##name(int descriptor, long first, long second, long third, long fourth) __asm__(#name); \

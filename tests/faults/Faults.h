@@ -10,7 +10,7 @@
 
 #include "Operations.h"
 
-// Fault injection: lets system calls and allocations fail on the test's thread. Functions of the emulated object
+// Fault injection: makes system calls and allocations fail on the test's thread. Functions of the emulated object
 // manager never fail and are not counted.
 
 namespace faults {

@@ -37,7 +37,7 @@ struct OperationFailure {
 /** Called before every operation, on its thread. Returns how the operation fails. */
 typedef struct OperationFailure (*OperationHook)(enum OperationKind kind);
 
-/** Sets the hook. Null, the initial value, lets every operation succeed. */
+/** Sets the hook. With null, the initial value, every operation succeeds. */
 __attribute__((visibility("default"))) void setOperationHook(OperationHook hook);
 
 /** Called before a file is created, on the creating thread. */

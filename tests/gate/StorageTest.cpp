@@ -37,8 +37,8 @@ struct FullFileSystem {
 };
 
 /**
- * Controls opening files for writing during its lifetime: each '+' of the string lets a call succeed, each '-' makes
- * it fail; the last character applies to all later calls.
+ * Controls opening files for writing during its lifetime: for each '+' of the string, a call succeeds, for each '-' one
+ * fails; the last character applies to all later calls.
  */
 struct OpenResults {
     static inline const char* results = "+";

@@ -157,7 +157,7 @@ TEST_F(AssetCalls, StopAfterAFailedRead) {
               (Calls{"read text USER.Phone locked", "unlock locked", "~PropertyFile"}));
 }
 
-/** Lets the lock fail when it is acquired for the Nth time. */
+/** Makes the Nth acquisition of the lock fail. */
 void failLock(int number, const std::function<void()>& failure) {
     assetFileDouble::before(lock, [number, failure, taken = 0]() mutable {
         if (++taken == number) {

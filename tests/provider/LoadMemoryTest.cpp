@@ -1,5 +1,5 @@
-// Loading with little memory. The program replaces sysconf and operator new, the variant that does not throw included:
-// memory from a sanitizer's own variant could not be released by the operator below.
+// Loading with little memory. The program replaces sysconf and operator new, including its nothrow variant, since the
+// operator delete below cannot release memory from a sanitizer's variant.
 
 #include "RecordKinds.h"
 

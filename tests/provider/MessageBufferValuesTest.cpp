@@ -1,4 +1,4 @@
-// Values of the provider's parameter lists, inserted into a message buffer directly instead of its stream.
+// Values of the provider's parameter lists, inserted into a message buffer directly, not through its stream.
 
 #include "KO/Moniker.h"
 #include "LeaseBase.h"

@@ -12,7 +12,7 @@
  */
 extern const char* const agentNodes;
 
-/** A program that defines it has no log. */
+/** If a test program defines this, the agent writes no log. */
 extern const bool agentHasNoLog __attribute__((weak));
 
 /** The version of the agent's product, if the program defines it; otherwise "4.2.0". */

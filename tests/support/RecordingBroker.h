@@ -21,8 +21,8 @@ struct RecordedCall {
 using cimhost::lab::Manager;
 
 /**
- * A cimhost::Broker that records the calls of a provider, and lets calls fail. Thread-safe. It must outlive the
- * provider.
+ * A cimhost::Broker that records the calls of a provider, and makes selected calls fail. Thread-safe. It must outlive
+ * the provider.
  *
  * Functions are named by table and function, as in the CMPI standard: "CMPIBrokerEncFT.newInstance",
  * "CMPIObjectPathFT.getKey", "CMPIStringFT.getCharPtr". Other names are a std::invalid_argument.
@@ -76,14 +76,14 @@ public:
     void failEvery(const std::string& function, CMPIrc rc);
 
     /**
-     * Lets one call, or all following ones, return null, 0 or null data with the status CMPI_RC_OK: null characters
+     * Makes one call, or all following ones, return null, 0 or null data with the status CMPI_RC_OK: null characters
      * (CMPIStringFT.getCharPtr), a null namespace (CMPIObjectPathFT.getNameSpace), no new object and so on.
      */
     void answerNothing(const std::string& function, int number);
     void answerNothingEver(const std::string& function);
 
     /**
-     * Lets a function that returns CMPIData by name (CMPIObjectPathFT.getKey, CMPIInstanceFT.getProperty,
+     * Makes a function that returns CMPIData by name (CMPIObjectPathFT.getKey, CMPIInstanceFT.getProperty,
      * CMPIContextFT.getEntry, CMPIArgsFT.getArg) return this for a case-insensitive name. Objects in the data must
      * outlive the calls: create them with the functions below.
      */

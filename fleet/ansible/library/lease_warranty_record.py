@@ -26,7 +26,7 @@ options:
 
 
 def wanted(kind, values):
-    """The values as cimhost takes and returns them, of the types that the class declares."""
+    """Converts the values to the types that the class declares, in the form that cimhost uses."""
     declared, = [each for each in query("classes") if each["class"] == kind.class_name]
     types = {each["name"]: each["type"] for each in declared["properties"] if each["writable"]}
     unknown = sorted(set(values) - set(types))

@@ -6,7 +6,7 @@
 #include "lab/emulation/RequestAdaptation.h"
 #include "operations/ManagerBehaviour.h"
 
-// The single emulations, and what they share.
+// The emulation of each object manager, and their common parts.
 
 namespace cimhost::lab {
 
