@@ -121,13 +121,12 @@ void addProduct(std::vector<Case>& cases) {
     }
 }
 
-Case associationCase(std::string operation, std::size_t computers, ExpectedRequest request) {
-    constexpr std::size_t size = 1000;
+Case associationCase(std::string operation, std::size_t computers, ExpectedRequest request, std::size_t size = 1000) {
     Case one = readCase<LeaseRow>(std::move(operation), size, std::move(request));
     one.className = names::leaseSettingClass;
     one.twice = nullptr;  // the gate returns other results
     one.computers = computers;
-    one.baseline = [](const Environment&, const CMPIBroker* broker) {
+    one.baseline = [size](const Environment&, const CMPIBroker* broker) {
         return makeAssociationBaseline(broker, makeRows<LeaseRow>(size));
     };
     return one;
@@ -160,7 +159,9 @@ std::vector<Case> associationCases() {
     const Request ofLease = Request::associators(lease, filter);
     // From a lease, the provider omits the last computer: of one computer it returns none, of two the first.
     return {
+        associationCase("AssociatorNames.fromComputer", 1, {namesOfComputer, 1}, 10),
         associationCase("AssociatorNames.fromComputer", 1, {namesOfComputer, 1}),
+        associationCase("AssociatorNames.fromComputer", 1, {namesOfComputer, 1}, largestSize),
         associationCase("Associators.fromComputer", 1, {ofComputer, 1}),
         associationCase("AssociatorNames.fromLease", 1, {namesOfLease, 0}),
         associationCase("Associators.fromLease", 1, {ofLease, 0}),

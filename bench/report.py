@@ -21,8 +21,10 @@ HERE = pathlib.Path(__file__).resolve().parent
 DOCUMENT = HERE.parent / "docs" / "performance-figures.md"
 PICTURE = HERE.parent / "docs" / "performance.svg"
 INSTRUCTIONS = HERE / "instructions.json"
-PLOTTED = ("Load", "EnumInstances", "EnumInstanceNames", "GetInstance.middle", "ModifyInstance")
-PLOTTED_CLASS = "VELKO_Lease"
+SEARCHES = (("Getting a lease", ("GetInstance.middle", "VELKO_Lease")),
+            ("From the computer to its lease", ("AssociatorNames.fromComputer", "VELKO_LeaseSetting")))
+PLOTTED = [*((operation, "VELKO_Lease") for operation in ("Load", "EnumInstances", "EnumInstanceNames", "ModifyInstance")),
+           *(case for what, case in SEARCHES)]
 HEAD = "<!-- Written by script/benchmark. -->\n\n# Performance figures\n\n"
 SIDES = ("provider", "baseline")
 # Loading is timed separately, other requests alternately with the baseline.
@@ -153,14 +155,16 @@ class Limit:
 def limits_of(cases, results):
     leases = {operation: by_size for (operation, class_name), by_size in cases.items() if class_name == "VELKO_Lease"}
     enumeration = leases["EnumInstances"][1000]
-    scans = [leases[f"GetInstance.{place}"][10000]["provider"] / 10000 for place in ("first", "middle", "last")]
     gated = enumeration["gated"] / enumeration["alone"] - 1
     added = leases["GetInstance.middle"][10]["gated"] - leases["GetInstance.middle"][10]["alone"]
     counted = json.loads(INSTRUCTIONS.read_text(encoding="utf-8"))
     counted_part = counted["EnumInstances/VELKO_Lease/gate/1000"] / counted["EnumInstances/VELKO_Lease/provider/1000"]
     limits = [Limit("Enumerating 1,000 leases, relative to the baseline", enumeration["provider"] / enumeration["baseline"], 3,
-                    "the broker calls, which the baseline makes too"),
-              Limit("Getting one of 10,000 leases, nanoseconds per record", max(scans), 100, "one walk over the table")]
+                    "the broker calls, which the baseline makes too")]
+    for what, case in SEARCHES:
+        few, many = (cases[case][size]["provider"] for size in (10, 1000000))
+        limits += [Limit(f"{what}: time among 1,000,000, relative to 10", many / few, 2, "one lookup in the index"),
+                   Limit("The same in microseconds", many / 1e3, 20, "the same")]
     limits += [Limit(f"{what}: time per record with 1,000,000, relative to 10,000", growth(leases[operation]), 1.5,
                      f"{bound}; the baseline: {growth(leases[operation], 'baseline'):.2f}")
                for what, operation, bound in LARGEST]
@@ -183,11 +187,11 @@ def limits_table(limits):
 
 
 def draw(cases):
-    """Draws the time per record of some requests, of provider and baseline, over the number of records."""
-    columns = [cases[(operation, PLOTTED_CLASS)] for operation in PLOTTED]
+    """Draws the time of some requests, of provider and baseline, over the number of records."""
+    columns = [cases[case] for case in PLOTTED]
     lines = []
     for size in sorted({size for by_size in columns for size in by_size}):
-        cells = [f"{by_size[size][side] / size:.6g}" if size in by_size else "-"
+        cells = [f"{by_size[size][side] / 1e9:.6g}" if size in by_size else "-"
                  for by_size in columns for side in SIDES]
         lines.append(" ".join([str(size), *cells]))
     with tempfile.NamedTemporaryFile("w", suffix=".dat") as data:

@@ -33,7 +33,7 @@ public:
 
     std::shared_ptr<Instance> share() const { return instance; }
 
-    /** The instance, which nobody shares. */
+    /** The instance, which is copied first if it is shared. */
     Instance& writable() {
         if (instance.use_count() > 1) {
             instance = std::make_shared<Instance>(*instance);

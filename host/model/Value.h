@@ -62,7 +62,7 @@ struct ScalarRange {
     const Scalar& operator[](std::size_t index) const { return first[index]; }
 };
 
-/** A CIM value, also null, with its declared type. A value that is not an array needs no allocation of its own. */
+/** A CIM value, also null, with its declared type. Only an array needs memory outside of it. */
 struct Value {
     CMPIType type = CMPI_null;     ///< element type, without CMPI_ARRAY
     bool isArray = false;          ///< whether it is an array of that type
