@@ -67,9 +67,9 @@ void addCimHeaders(MHD_Response* response, const std::string& prefix) {
     MHD_add_response_header(response, "Cache-Control", "no-cache");
     MHD_add_response_header(response, (prefix + "CIMOperation").c_str(), "MethodResponse");
     if (!prefix.empty()) {
-        MHD_add_response_header(response, "Ext", "");
-        const std::string man = "http://www.dmtf.org/cim/mapping/http/v1.0 ; ns=" + prefix.substr(0, 2);
-        MHD_add_response_header(response, "Man", man.c_str());
+        for (const auto& [name, value] : extensionHeaders(prefix)) {
+            MHD_add_response_header(response, name.c_str(), value.c_str());
+        }
     }
 }
 
@@ -197,7 +197,7 @@ struct HttpServer::Endpoint {
             return send(connection, exchange, *refused);
         }
         const Response response = textResponse(std::get<std::shared_ptr<cimxml::ResponseText>>(reply));
-        addCimHeaders(response.get(), exchange.headers.extensionPrefix);
+        addCimHeaders(response.get(), exchange.extensionPrefix);
         return queue(connection, exchange, response, MHD_HTTP_OK);
     }
 

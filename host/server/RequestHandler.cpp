@@ -34,9 +34,10 @@ RequestHandler::RequestHandler(const Settings& itsSettings, cimxml::Operations& 
 
 std::optional<HttpResponse> RequestHandler::begin(Exchange& exchange, const HttpRequest& request) {
     const std::string length = headerIn(request.headers, "Content-Length").value_or("0");
+    exchange.extensionPrefix = extensionPrefixOf(request);
     auto refused = check(exchange, request);
     exchange.isBodyIgnored = refused && (length != "0" || request.headers.count("Transfer-Encoding") != 0);
-    return refused;
+    return refused ? std::optional(withExtension(*refused, exchange.extensionPrefix)) : std::nullopt;
 }
 
 std::optional<HttpResponse> RequestHandler::check(Exchange& exchange, const HttpRequest& request) {
@@ -104,6 +105,14 @@ std::size_t RequestHandler::mostIgnored() const {
 }
 
 Reply RequestHandler::finish(Exchange& exchange) {
+    Reply reply = answer(exchange);
+    if (auto* refused = std::get_if<HttpResponse>(&reply)) {
+        return withExtension(std::move(*refused), exchange.extensionPrefix);
+    }
+    return reply;
+}
+
+Reply RequestHandler::answer(Exchange& exchange) {
     if (exchange.refused) {
         return *exchange.refused;
     }

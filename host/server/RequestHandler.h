@@ -23,7 +23,8 @@ struct Exchange {
     HeaderRules rules{};
     Connection* connection = nullptr;
     bool needsAuthentication = true;
-    CimHeaders headers{};  ///< of a request that has passed the checks
+    CimHeaders headers{};           ///< of a request that has passed the checks
+    std::string extensionPrefix{};  ///< of the headers of an M-POST request, else empty
     cimxml::Caller caller{};
     std::string body{};
     bool isBodyIgnored = false;             ///< whether the response is sent before the body has arrived
@@ -73,6 +74,7 @@ private:
     std::optional<HttpResponse> check(Exchange& exchange, const HttpRequest& request);
     std::optional<HttpResponse> authenticate(Exchange& exchange, const HttpRequest& request);
     Right verified(Exchange& exchange, const std::string& authorization);
+    Reply answer(Exchange& exchange);
     Reply perform(Exchange& exchange);
 
     const Settings& settings;
