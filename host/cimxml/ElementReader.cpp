@@ -139,6 +139,13 @@ const Property* findKey(const Class* known, const std::string& name) {
 
 }  // namespace
 
+void requireFew(const XmlElement& element) {
+    constexpr std::size_t most = 1'000;
+    if (element.children.size() > most) {
+        invalid("Element " + element.name + " has more than " + std::to_string(most) + " elements.");
+    }
+}
+
 Scalar scalarFrom(const std::string& characters, CMPIType type) {
     return typedScalar(literalFrom(characters, type), type);
 }
@@ -164,6 +171,7 @@ ObjectPath ElementReader::path(const XmlElement& element) const {
 }
 
 ObjectPath ElementReader::instanceName(const XmlElement& element, const std::string& itsNameSpace) const {
+    requireFew(element);
     ObjectPath path;
     path.nameSpace = itsNameSpace;
     path.className = attributeOf(element, element.name == "CLASSNAME" ? "NAME" : "CLASSNAME");
@@ -199,6 +207,7 @@ Instance ElementReader::instance(const XmlElement& element) const {
     if (element.name != "INSTANCE") {
         invalid("Element " + element.name + " is not an INSTANCE.");
     }
+    requireFew(element);
     Instance instance;
     instance.path.nameSpace = nameSpace;
     instance.path.className = attributeOf(element, "CLASSNAME");

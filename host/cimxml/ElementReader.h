@@ -42,6 +42,12 @@ private:
     std::string nameSpace;
 };
 
+/**
+ * Limits the properties, keys or names in an element, since some work is quadratic in their number.
+ * @throws CimError if there are more than 1,000
+ */
+void requireFew(const XmlElement& element);
+
 /** The characters of an element as one value of a simple type. @throws ValueError if they do not fit it */
 Scalar scalarFrom(const std::string& characters, CMPIType type);
 

@@ -44,6 +44,15 @@ Response Operations::send(const Call& call, Request request) const {
     return response;
 }
 
+/** A class of the schema without a provider has no instances, and none can be made. */
+void Operations::requireProvider(const Call& call, const ObjectPath& path, int code) const {
+    const bool isServed =
+        call.isInterop || registry.find(path.nameSpace, path.className, InterfaceKind::instance) != nullptr;
+    if (!isServed && call.schema.findClass(path.className) != nullptr) {
+        throw CimError(code, "No provider serves instances of class " + path.className + ".");
+    }
+}
+
 Response Operations::enumerate(const Call& call, Request request) const {
     const ObjectPath path = request.path;
     std::vector<std::string> names{path.className};
@@ -111,11 +120,13 @@ OperationResult Operations::getInstance(const Call& call) {
     const InstanceParts parts = partsOf(call);
     const ObjectPath path = call.arguments.path("InstanceName");
     requireKeys(path, call.schema);
+    requireProvider(call, path, CMPI_RC_ERR_NOT_FOUND);
     return streamed(call, {send(call, Request::getInstance(path, parts.properties)), ObjectForm::instance, parts});
 }
 
 OperationResult Operations::createInstance(const Call& call) {
     const Instance instance = call.arguments.reader().instance(call.arguments.required("NewInstance"));
+    requireProvider(call, instance.path, CMPI_RC_ERR_NOT_SUPPORTED);
     ResultCursor created{send(call, Request::createInstance(instance.path, instance)), ObjectForm::instanceName};
     return streamed(call, std::move(created));
 }
@@ -123,6 +134,7 @@ OperationResult Operations::createInstance(const Call& call) {
 OperationResult Operations::modifyInstance(const Call& call) {
     const Instance modified = call.arguments.reader().namedInstance(call.arguments.required("ModifiedInstance"));
     requireKeys(modified.path, call.schema);
+    requireProvider(call, modified.path, CMPI_RC_ERR_NOT_SUPPORTED);
     send(call, Request::modifyInstance(modified.path, modified, call.arguments.strings("PropertyList")));
     return {};
 }
@@ -130,6 +142,7 @@ OperationResult Operations::modifyInstance(const Call& call) {
 OperationResult Operations::deleteInstance(const Call& call) {
     const ObjectPath path = call.arguments.path("InstanceName");
     requireKeys(path, call.schema);
+    requireProvider(call, path, CMPI_RC_ERR_NOT_SUPPORTED);
     send(call, Request::deleteInstance(path));
     return {};
 }

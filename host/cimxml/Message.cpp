@@ -12,10 +12,6 @@ namespace {
 constexpr unsigned badRequest = 400;
 constexpr unsigned notImplemented = 501;
 
-[[noreturn]] void invalid(const std::string& why) {
-    throw RequestRefused(badRequest, "request-not-valid", why);
-}
-
 [[noreturn]] void notLooselyValid(const std::string& why) {
     throw RequestRefused(badRequest, "request-not-loosely-valid", why);
 }
@@ -64,11 +60,8 @@ void readParameters(Message& message, const XmlElement& call, std::string_view e
         if (each.name != elementName) {
             continue;
         }
-        const std::string& name = attributeOf(each, "NAME");
-        if (message.find(name) != nullptr) {
-            invalid("Parameter " + name + " is there twice.");
-        }
-        message.parameters.emplace_back(name, each.children.empty() ? XmlElement{} : each.children.front());
+        message.parameters.emplace_back(attributeOf(each, "NAME"),
+                                        each.children.empty() ? XmlElement{} : each.children.front());
     }
 }
 

@@ -94,15 +94,19 @@ std::string startTagOf(const NamedValue& property, const Property* declared) {
     return xml;
 }
 
+bool isRepresentable(const Scalar& scalar) {
+    if (const auto* string = std::get_if<std::string>(&scalar)) {
+        return cimxml::isRepresentable(*string);
+    }
+    const bool isShort = std::holds_alternative<Char16>(scalar) || std::holds_alternative<DateTime>(scalar);
+    return !isShort || cimxml::isRepresentable(charactersOf(scalar));
+}
+
 void requireRepresentable(const Value& value, const std::string& className, const std::string& name) {
     for (const Scalar& scalar : value.elements()) {
-        const auto* string = std::get_if<std::string>(&scalar);
-        if (string != nullptr && !isRepresentable(*string)) {
+        if (!isRepresentable(scalar)) {
             throw CimError(CMPI_RC_ERR_FAILED,
                            "The value of " + className + "." + name + " has a character that XML cannot represent.");
-        }
-        if (const auto* dateTime = std::get_if<DateTime>(&scalar); dateTime != nullptr) {
-            requireRepresentable(Value::of(dateTime->value), className, name);
         }
         if (const ObjectPath* path = referenceIn(scalar)) {
             cimxml::requireRepresentable(*path);

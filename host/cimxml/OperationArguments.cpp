@@ -1,5 +1,6 @@
 #include "cimxml/OperationArguments.h"
 
+#include <set>
 #include <sstream>
 
 #include "cim/Names.h"
@@ -23,6 +24,7 @@ const std::string& valueOf(std::string_view name, const XmlElement& element) {
 }  // namespace
 
 void OperationArguments::requireKnown(std::string_view names) const {
+    std::set<std::string, cim::NameLess> found;
     for (const auto& [name, element] : message.parameters) {
         std::istringstream known{std::string(names)};
         std::string each;
@@ -32,6 +34,9 @@ void OperationArguments::requireKnown(std::string_view names) const {
         }
         if (!isKnown) {
             invalid(name, "is not one of " + message.method);
+        }
+        if (!found.insert(name).second) {
+            invalid(name, "is there twice");
         }
     }
 }
@@ -73,6 +78,7 @@ PropertyList OperationArguments::strings(std::string_view name) const {
     if (element->name != "VALUE.ARRAY") {
         invalid(name, "is not an array");
     }
+    requireFew(*element);
     std::vector<std::string> values;
     for (const XmlElement& each : element->children) {
         values.push_back(valueOf(name, each));

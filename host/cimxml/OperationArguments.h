@@ -21,7 +21,7 @@ public:
     const std::string& nameSpace() const { return message.nameSpace; }
     const ElementReader& reader() const { return elements; }
 
-    /** Refuses parameters that are not in a list of names separated by blanks. */
+    /** Refuses parameters that are there twice or not in a list of names separated by blanks. */
     void requireKnown(std::string_view names) const;
 
     bool has(std::string_view name) const { return message.find(name) != nullptr; }

@@ -116,6 +116,7 @@ private:
     ///@}
 
     Response send(const Call& call, Request request) const;
+    void requireProvider(const Call& call, const ObjectPath& path, int code) const;
     Response enumerate(const Call& call, Request request) const;
     Response associate(const Call& call, Request request) const;
     ResultCursor enumeration(const Call& call) const;

@@ -33,7 +33,7 @@ ResponseText::ResponseText(const Message& request, const CimError& error)
     : isIntrinsic(request.isIntrinsic), head(headFor(request)), code(error.code) {
     const Element element(head, "ERROR", [&] {
         appendAttribute(head, "CODE", std::to_string(error.code));
-        appendAttribute(head, "DESCRIPTION", representable(error.what()));
+        appendAttribute(head, "DESCRIPTION", error.what());
     });
 }
 

@@ -4,6 +4,7 @@
 #include <libxml/parser.h>
 
 #include <algorithm>
+#include <array>
 #include <limits>
 #include <memory>
 #include <optional>
@@ -13,6 +14,39 @@ namespace {
 
 std::string stringOf(const xmlChar* characters) {
     return reinterpret_cast<const char*>(characters);
+}
+
+/** The number of bytes of a start tag. @throws XmlError if it has many attributes */
+std::size_t lengthOfTag(std::string_view markup) {
+    constexpr std::size_t most = 64;
+    std::size_t attributes = 0;
+    char quote = '\0';
+    for (std::size_t at = 1; at < markup.size(); ++at) {
+        const char each = markup[at];
+        if (quote != '\0') {
+            quote = each == quote ? '\0' : quote;
+        } else if (each == '"' || each == '\'') {
+            quote = each;
+        } else if (each == '>') {
+            return at;
+        } else if (each == '=' && ++attributes > most) {
+            throw XmlError("an element has more than " + std::to_string(most) + " attributes");
+        }
+    }
+    return markup.size();
+}
+
+/** Refuses elements with many attributes before they are parsed: libxml2 compares each attribute with all others. */
+void requireFewAttributes(std::string_view document) {
+    constexpr std::array<std::pair<std::string_view, std::string_view>, 3> others{
+        {{"<!--", "-->"}, {"<![CDATA[", "]]>"}, {"<?", "?>"}}};
+    for (std::size_t at = document.find('<'); at != std::string_view::npos; at = document.find('<', at)) {
+        const std::string_view markup = document.substr(at);
+        const auto* const other = std::find_if(others.begin(), others.end(), [&](const auto& each) {
+            return markup.substr(0, each.first.size()) == each.first;
+        });
+        at = other == others.end() ? at + lengthOfTag(markup) : document.find(other->second, at + other->first.size());
+    }
 }
 
 /** Builds the tree from the events of libxml2's parser. */
@@ -26,6 +60,7 @@ public:
         if (document.size() > static_cast<std::size_t>(std::numeric_limits<int>::max())) {
             throw XmlError("the document is too large");
         }
+        requireFewAttributes(document);
         xmlSAXHandler events = handler();
         const std::unique_ptr<xmlParserCtxt, decltype(&xmlFreeParserCtxt)> context(
             xmlCreatePushParserCtxt(&events, this, nullptr, 0, nullptr), &xmlFreeParserCtxt);

@@ -24,11 +24,12 @@ struct XmlElement {
 };
 
 struct XmlLimits {
-    std::size_t depth = 64;          ///< elements within elements
-    std::size_t elements = 500'000;  ///< elements of a document
+    std::size_t depth = 64;         ///< elements within elements
+    std::size_t elements = 50'000;  ///< elements of a document
 };
 
-/** A document that is not well-formed, has a document type declaration or exceeds a limit. */
+/** A document that is not well-formed, has a document type declaration, many attributes or more than a limit permits.
+ */
 class XmlError : public std::runtime_error {
 public:
     using std::runtime_error::runtime_error;

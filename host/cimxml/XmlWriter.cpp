@@ -1,6 +1,6 @@
 #include "cimxml/XmlWriter.h"
 
-#include <algorithm>
+#include <array>
 
 #include "cim/Utf8.h"
 
@@ -19,6 +19,8 @@ const char* entityOf(char character) {
             return "&quot;";
         case '\'':
             return "&apos;";
+        case '\r':
+            return "&#13;";  // a parser reads others as line feeds
         default:
             return nullptr;
     }
@@ -30,11 +32,20 @@ bool isPermitted(const cim::Utf8Character& character) {
            code != 0xFFFF;
 }
 
-/** Number of leading bytes that are printable ASCII, which nearly all values consist of. */
+/** The bytes that are written as they are: ASCII without control characters and those that are escaped. */
+constexpr std::array<bool, 256> makePlain() {
+    std::array<bool, 256> plain{};
+    for (std::size_t byte = ' '; byte < 0x7F; ++byte) {
+        plain[byte] = byte != '&' && byte != '<' && byte != '>' && byte != '"' && byte != '\'';
+    }
+    return plain;
+}
+
+/** Number of leading plain bytes, which nearly all values consist of. */
 std::size_t plainLength(std::string_view characters) {
+    static constexpr std::array<bool, 256> plain = makePlain();
     std::size_t length = 0;
-    const auto isPlain = [](unsigned char byte) { return byte >= 0x20 && byte < 0x80; };
-    while (length < characters.size() && isPlain(static_cast<unsigned char>(characters[length]))) {
+    while (length < characters.size() && plain[static_cast<unsigned char>(characters[length])]) {
         ++length;
     }
     return length;
@@ -44,15 +55,21 @@ std::size_t plainLength(std::string_view characters) {
 
 void appendEscaped(std::string& xml, std::string_view characters) {
     while (true) {
-        const auto special = std::find_if(characters.begin(), characters.end(),
-                                          [](char character) { return entityOf(character) != nullptr; });
-        const auto plain = static_cast<std::size_t>(special - characters.begin());
-        xml += characters.substr(0, plain);
-        if (special == characters.end()) {
+        const std::size_t length = plainLength(characters);
+        xml.append(characters, 0, length);
+        characters.remove_prefix(length);
+        if (characters.empty()) {
             return;
         }
-        xml += entityOf(*special);
-        characters.remove_prefix(plain + 1);
+        const cim::Utf8Character first = cim::firstCharacter(characters);
+        if (const char* entity = entityOf(characters.front())) {
+            xml += entity;
+        } else if (isPermitted(first)) {
+            xml.append(characters, 0, first.length);
+        } else {
+            xml += "\xEF\xBF\xBD";
+        }
+        characters.remove_prefix(first.length);
     }
 }
 
@@ -65,25 +82,17 @@ void appendAttribute(std::string& xml, std::string_view name, std::string_view v
 }
 
 bool isRepresentable(std::string_view characters) {
-    characters.remove_prefix(plainLength(characters));
-    while (!characters.empty()) {
+    while (true) {
+        characters.remove_prefix(plainLength(characters));
+        if (characters.empty()) {
+            return true;
+        }
         const cim::Utf8Character first = cim::firstCharacter(characters);
         if (!isPermitted(first)) {
             return false;
         }
         characters.remove_prefix(first.length);
     }
-    return true;
-}
-
-std::string representable(std::string_view characters) {
-    std::string result;
-    while (!characters.empty()) {
-        const cim::Utf8Character first = cim::firstCharacter(characters);
-        result += isPermitted(first) ? std::string(characters.substr(0, first.length)) : std::string("\xEF\xBF\xBD");
-        characters.remove_prefix(first.length);
-    }
-    return result;
 }
 
 }  // namespace cimhost::cimxml

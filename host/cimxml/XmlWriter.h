@@ -6,8 +6,9 @@
 namespace cimhost::cimxml {
 
 /**
- * Appends a string as character data or attribute value. Escapes with the five predefined entities only, since some
- * clients understand no others.
+ * Appends a string as character data or attribute value. Escapes with the five predefined entities, since some clients
+ * understand no others, and carriage returns with a character reference. Replaces what XML 1.0 cannot represent by
+ * U+FFFD, so that the document is well-formed whatever the string is.
  */
 void appendEscaped(std::string& xml, std::string_view characters);
 
@@ -16,9 +17,6 @@ void appendAttribute(std::string& xml, std::string_view name, std::string_view v
 
 /** Whether XML 1.0 can represent a string: valid UTF-8 without control characters except tab and line ends. */
 bool isRepresentable(std::string_view characters);
-
-/** Replaces what XML 1.0 cannot represent by U+FFFD. */
-std::string representable(std::string_view characters);
 
 /** Appends a start tag with the attributes that a function appends. */
 template <class Attributes>

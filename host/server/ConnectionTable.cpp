@@ -1,122 +1,238 @@
 #include "server/ConnectionTable.h"
 
-#include <linux/tcp.h>
-#include <netinet/in.h>
 #include <sys/socket.h>
 
 #include <algorithm>
 #include <string_view>
+#include <utility>
+
+#include "server/Sockets.h"
 
 namespace cimhost::server {
 namespace {
 
-/** Number of bytes that a socket has received. */
-std::uint64_t bytesReceived(int socket) {
-    tcp_info info{};
-    socklen_t size = sizeof info;
-    return ::getsockopt(socket, IPPROTO_TCP, TCP_INFO, &info, &size) == 0 ? info.tcpi_bytes_received : 0;
-}
+/** A client that does not complete a body, or receives no byte of a response, for this time makes no progress. */
+constexpr std::chrono::seconds stalledTime{1};
 
-void end(const Connection& connection) {
-    const bool awaitsRequest = connection.phase() == Connection::Phase::body;
-    if (awaitsRequest && !connection.isTls()) {
-        constexpr std::string_view timeout =
-            "HTTP/1.1 408 Request Timeout\r\nConnection: close\r\nContent-Length: 0\r\n\r\n";
-        static_cast<void>(::send(connection.socket(), timeout.data(), timeout.size(), MSG_NOSIGNAL | MSG_DONTWAIT) < 0);
-    }
-    ::shutdown(connection.socket(), SHUT_RDWR);
-}
+/** Bytes that a TLS client sends at most when it closes a connection. */
+constexpr std::uint64_t closureSize = 64;
+
+using Guard = std::lock_guard<std::mutex>;
 
 }  // namespace
 
-Connection::Connection(int itsSocket, bool isTls)
-    : descriptor(itsSocket), tls(isTls), since(Clock::now().time_since_epoch().count()) {}
+Connection::Connection(int itsSocket, bool isTls, ClientAddress itsClient)
+    : descriptor(itsSocket),
+      tls(isTls),
+      origin(std::move(itsClient)),
+      current(isTls ? Phase::handshake : Phase::idle),
+      since(Clock::now()),
+      progress(since) {}
 
-void Connection::enter(Phase next) {
+bool Connection::enter(Phase next) {
+    const Guard lock(mutex);
     current = next;
-    since = Clock::now().time_since_epoch().count();
+    since = Clock::now();
+    progress = since;
+    headSince = {};
     if (next == Phase::idle) {
         received = bytesReceived(descriptor);
     }
+    return cause == Cause::none;
 }
 
-Connection* ConnectionTable::add(int socket, bool isTls) {
-    const std::lock_guard<std::mutex> lock(mutex);
-    if (connections.size() >= limits.connections) {
-        endLongestIdle();
+Connection::Phase Connection::phase() const {
+    const Guard lock(mutex);
+    return current;
+}
+
+void Connection::endHandshake() {
+    enter(Phase::idle);
+    const Guard lock(mutex);
+    received -= std::min(received, bytesUnread(descriptor));  // the client may have sent its request already
+}
+
+void Connection::trust() {
+    const Guard lock(mutex);
+    isTrusted = true;
+}
+
+void Connection::wait(std::chrono::milliseconds time) {
+    std::unique_lock<std::mutex> lock(mutex);
+    ended.wait_for(lock, time, [&] { return cause != Cause::none; });
+}
+
+bool Connection::hasTimedOut() const {
+    const Guard lock(mutex);
+    return cause == Cause::time;
+}
+
+bool Connection::hasPartOfHead() const {
+    const Guard lock(mutex);
+    return current == Phase::idle && bytesReceived(descriptor) - received > (tls ? closureSize : 0);
+}
+
+bool Connection::isEnding() const {
+    const Guard lock(mutex);
+    return cause != Cause::none;
+}
+
+void Connection::end(Cause why) {
+    const Guard lock(mutex);
+    if (cause != Cause::none) {
+        return;
     }
-    return &connections.emplace_back(socket, isTls);
-}
-
-void ConnectionTable::remove(const Connection* connection) {
-    const std::lock_guard<std::mutex> lock(mutex);
-    connections.remove_if([&](const Connection& each) { return &each == connection; });
-}
-
-std::size_t ConnectionTable::size() const {
-    const std::lock_guard<std::mutex> lock(mutex);
-    return connections.size();
-}
-
-std::size_t ConnectionTable::busy() const {
-    const std::lock_guard<std::mutex> lock(mutex);
-    return static_cast<std::size_t>(std::count_if(connections.begin(), connections.end(), [](const Connection& each) {
-        return each.phase() != Connection::Phase::idle;
-    }));
-}
-
-void ConnectionTable::endLongestIdle() {
-    Connection* longest = nullptr;
-    for (Connection& each : connections) {
-        const bool isIdle = each.phase() == Connection::Phase::idle && !each.isEnding;
-        if (isIdle && (longest == nullptr || each.since < longest->since)) {
-            longest = &each;
-        }
+    cause = why;
+    if (why == Cause::time && current == Phase::body && !tls) {
+        constexpr std::string_view timeout =
+            "HTTP/1.1 408 Request Timeout\r\nConnection: close\r\nContent-Length: 0\r\n\r\n";
+        static_cast<void>(::send(descriptor, timeout.data(), timeout.size(), MSG_NOSIGNAL | MSG_DONTWAIT) < 0);
     }
-    if (longest != nullptr) {
-        longest->isEnding = true;
-        end(*longest);
-    }
+    ::shutdown(descriptor, SHUT_RDWR);
+    ended.notify_all();
 }
 
-bool ConnectionTable::isOverdue(Connection& connection, Connection::Clock::time_point now) const {
-    const auto age = now.time_since_epoch() - Connection::Clock::duration(connection.since);
-    switch (connection.phase()) {
-        case Connection::Phase::body:
-            return age > limits.bodyTime;
-        case Connection::Phase::work:
+bool Connection::isOverdue(const Limits& limits, Clock::time_point now) {
+    const Guard lock(mutex);
+    const auto age = now - since;
+    switch (current) {
+        case Phase::handshake:
+            return age > limits.headTime;
+        case Phase::check:
+        case Phase::work:
             return false;
-        case Connection::Phase::response:
+        case Phase::body:
+            return age > limits.bodyTime;
+        case Phase::response:
+        case Phase::refusal:
             return age > limits.responseTime;
         default:
             break;
     }
-    if (bytesReceived(connection.socket()) == connection.received) {
-        connection.headSince = {};
+    if (bytesReceived(descriptor) == received) {
+        headSince = {};
         return age > limits.idleTime;
     }
-    if (connection.headSince == Connection::Clock::time_point{}) {
-        connection.headSince = now;
+    if (headSince == Clock::time_point{}) {
+        headSince = now;
     }
-    // Two samples may be of different requests: then the phase is younger.
-    return age > limits.headTime && now - connection.headSince > limits.headTime;
+    return now - headSince > limits.headTime;
+}
+
+void Connection::observe(Clock::time_point now) {
+    const Guard lock(mutex);
+    const std::uint64_t count = current == Phase::response ? bytesAcknowledged(descriptor) : acknowledged;
+    if (count != acknowledged) {
+        acknowledged = count;
+        progress = now;
+    }
+}
+
+std::optional<std::pair<int, Connection::Clock::time_point>> Connection::rank(Clock::time_point now) const {
+    const Guard lock(mutex);
+    if (cause != Cause::none) {
+        return std::nullopt;
+    }
+    const bool isStalled = now - progress > stalledTime;
+    switch (current) {
+        case Phase::refusal:
+            return std::pair{0, since};
+        case Phase::handshake:
+            return std::pair{1, since};
+        case Phase::idle:
+            return std::pair{isTrusted ? 3 : 1, since};
+        case Phase::body:
+            return std::pair{!isTrusted ? 1 : isStalled ? 2 : 5, since};
+        case Phase::response:
+            return isStalled ? std::optional(std::pair{4, since}) : std::nullopt;
+        default:
+            return std::nullopt;
+    }
+}
+
+Connection* ConnectionTable::add(int socket, bool isTls, ClientAddress client) {
+    const Guard lock(mutex);
+    const auto isNeighbour = [&](const Connection& each) { return each.origin.network == client.network; };
+    const bool hasRoom = count(isNeighbour) < limits.connectionsPerAddress || endOne(isNeighbour);
+    const auto isAny = [](const Connection&) { return true; };
+    if (hasRoom && count(isAny) >= limits.connections) {
+        endOne(isAny);
+    }
+    Connection& added = connections.emplace_back(socket, isTls, std::move(client));
+    if (!hasRoom || isClosed) {
+        added.end(Connection::Cause::room);
+    }
+    return &added;
+}
+
+void ConnectionTable::remove(const Connection* connection) {
+    const Guard lock(mutex);
+    connections.remove_if([&](const Connection& each) { return &each == connection; });
+}
+
+std::size_t ConnectionTable::size() const {
+    const Guard lock(mutex);
+    return connections.size();
+}
+
+std::size_t ConnectionTable::busy() const {
+    using Phase = Connection::Phase;
+    constexpr auto isBusy = [](Phase phase) {
+        return phase == Phase::check || phase == Phase::body || phase == Phase::work || phase == Phase::response;
+    };
+    const Guard lock(mutex);
+    return static_cast<std::size_t>(std::count_if(connections.begin(), connections.end(),
+                                                  [&](const Connection& each) { return isBusy(each.phase()); }));
+}
+
+/** Number of connections that are not being ended. */
+std::size_t ConnectionTable::count(const Filter& isCounted) const {
+    return static_cast<std::size_t>(std::count_if(connections.begin(), connections.end(), [&](const Connection& each) {
+        return isCounted(each) && !each.isEnding();
+    }));
+}
+
+bool ConnectionTable::endOne(const Filter& mayEnd) {
+    const auto now = Connection::Clock::now();
+    Connection* first = nullptr;
+    decltype(first->rank(now)) lowest;
+    for (Connection& each : connections) {
+        const auto rank = mayEnd(each) ? each.rank(now) : std::nullopt;
+        if (rank && (!lowest || *rank < *lowest)) {
+            lowest = rank;
+            first = &each;
+        }
+    }
+    if (first != nullptr) {
+        first->end(Connection::Cause::room);
+    }
+    return first != nullptr;
+}
+
+void ConnectionTable::endHandshake(int socket) {
+    const Guard lock(mutex);
+    for (Connection& each : connections) {
+        if (each.socket() == socket && each.phase() == Connection::Phase::handshake) {
+            each.endHandshake();
+        }
+    }
 }
 
 void ConnectionTable::endOverdue(Connection::Clock::time_point now) {
-    const std::lock_guard<std::mutex> lock(mutex);
+    const Guard lock(mutex);
     for (Connection& each : connections) {
-        if (isOverdue(each, now)) {
-            end(each);
+        each.observe(now);
+        if (each.isOverdue(limits, now)) {
+            each.end(Connection::Cause::time);
         }
     }
 }
 
-void ConnectionTable::endAll(bool alsoBusy) {
-    const std::lock_guard<std::mutex> lock(mutex);
-    for (const Connection& each : connections) {
-        if (alsoBusy || each.phase() == Connection::Phase::idle) {
-            ::shutdown(each.socket(), SHUT_RDWR);
-        }
+void ConnectionTable::endAll() {
+    const Guard lock(mutex);
+    isClosed = true;
+    for (Connection& each : connections) {
+        each.end(Connection::Cause::room);
     }
 }
 

@@ -1,80 +1,137 @@
 #pragma once
 
-#include <atomic>
 #include <chrono>
+#include <condition_variable>
 #include <cstdint>
+#include <functional>
 #include <list>
 #include <mutex>
+#include <optional>
 #include <string>
+#include <utility>
 
 #include "server/Settings.h"
 
 namespace cimhost::server {
 
-/** A client's connection, and the phase of its current request. Phases are set by the thread of the connection. */
+/** The origin of a connection. */
+struct ClientAddress {
+    std::string address{};  ///< with the port, for the access log
+    std::string network{};  ///< the part of the address that the limit of connections applies to
+};
+
+/** A client's connection, and the phase of its current request. Phases are entered by the thread of the connection. */
 class Connection {
 public:
+    using Clock = std::chrono::steady_clock;
     enum class Phase {
-        idle,     ///< no request, or the head of one arrives
-        body,     ///< the body arrives
-        work,     ///< the operation runs
-        response  ///< the client receives the response
+        handshake,  ///< of TLS
+        idle,       ///< no request, or the head of one arrives
+        check,      ///< the head is checked, with its password
+        body,       ///< the body arrives
+        work,       ///< the operation runs
+        response,   ///< the client receives the response
+        refusal     ///< the client waits for a refusal, or receives it
     };
 
-    explicit Connection(int itsSocket, bool isTls);
+    Connection(int itsSocket, bool isTls, ClientAddress itsClient = {});
 
-    void enter(Phase next);
-    Phase phase() const { return current; }
+    /** @return false if the table has ended the connection */
+    bool enter(Phase next);
+    Phase phase() const;
+
+    /** Marks a TLS connection as ready for requests. To be called when the client's last message has been read. */
+    void endHandshake();
+
+    /** Notes that the client has sent a request that was accepted: its connection is ended for new ones later. */
+    void trust();
+
+    /** Waits, but not longer than until the connection is ended. */
+    void wait(std::chrono::milliseconds time);
+
+    /** Whether it was ended because the client was too slow. */
+    bool hasTimedOut() const;
+
+    /** Whether a part of a head has arrived. */
+    bool hasPartOfHead() const;
+
     int socket() const { return descriptor; }
-    bool isTls() const { return tls; }
+    const ClientAddress& client() const { return origin; }
 
     /** @name The last accepted credentials, for later requests of this connection. Used by its thread only. */
     ///@{
     std::string authorization{};
-    std::chrono::steady_clock::time_point authorizedUntil{};
+    Clock::time_point authorizedUntil{};
     ///@}
 
 private:
     friend class ConnectionTable;
-    using Clock = std::chrono::steady_clock;
+    enum class Cause { none, time, room };
 
-    int descriptor;
-    bool tls;
-    std::atomic<Phase> current{Phase::idle};
-    std::atomic<Clock::rep> since;           ///< when the phase began
-    std::atomic<std::uint64_t> received{0};  ///< bytes received when it began
-    Clock::time_point headSince{};           ///< when the head began to arrive; of the watching thread only
-    bool isEnding = false;                   ///< whether it has been ended for a new one; guarded by the table
+    /** Shuts the connection down, so that its thread ends it. */
+    void end(Cause why);
+    bool isEnding() const;
+    bool isOverdue(const Limits& limits, Clock::time_point now);
+
+    /** Notes whether the client receives its response. */
+    void observe(Clock::time_point now);
+
+    /** Rank and age: the lower, the earlier it is ended for a new connection; none if it is not ended for one. */
+    std::optional<std::pair<int, Clock::time_point>> rank(Clock::time_point now) const;
+
+    const int descriptor;
+    const bool tls;
+    const ClientAddress origin;
+    mutable std::mutex mutex;
+    std::condition_variable ended;
+    Cause cause = Cause::none;
+    Phase current;
+    bool isTrusted = false;
+    Clock::time_point since;         ///< when the phase began
+    std::uint64_t received = 0;      ///< bytes received when it began
+    Clock::time_point headSince{};   ///< when the head was seen to have begun; none: it has not
+    std::uint64_t acknowledged = 0;  ///< bytes that the client had acknowledged at `progress`
+    Clock::time_point progress;      ///< when the phase began, or bytes of the response were last acknowledged
 };
 
-/** All connections. Ends those that exceed a time limit; a client that sends its request too slowly receives 408. */
+/**
+ * All connections. Ends those that exceed a time limit; a client without TLS that sends its body too slowly receives
+ * 408. If there are too many connections, of one network or altogether, each new one ends another: first those that
+ * were refused, then those that have not yet sent a request, then those whose body does not arrive, then idle ones,
+ * then those that do not receive their response, at last those whose body arrives; of several the oldest.
+ */
 class ConnectionTable {
 public:
     explicit ConnectionTable(const Limits& itsLimits) : limits(itsLimits) {}
 
     /**
-     * Adds a connection. If there are too many, the one that is longest without a request ends instead.
+     * Adds a connection. If its network has too many and none of them can be ended, the new one is ended.
      * @return the connection, which belongs to the table until it is removed
      */
-    Connection* add(int socket, bool isTls);
+    Connection* add(int socket, bool isTls, ClientAddress client = {});
     void remove(const Connection* connection);
     std::size_t size() const;
 
-    /** Number of connections with a request. */
+    /** Number of connections with a request that has not been refused. */
     std::size_t busy() const;
+
+    /** Marks the TLS connection of a socket as ready for requests. */
+    void endHandshake(int socket);
 
     /** Ends connections that have exceeded their time. To be called several times per second. */
     void endOverdue(Connection::Clock::time_point now);
 
-    /** Ends connections without a request, or all. */
-    void endAll(bool alsoBusy);
+    /** Ends all connections, also those that are added later; those at work end when the operation has ended. */
+    void endAll();
 
 private:
-    void endLongestIdle();
-    bool isOverdue(Connection& connection, Connection::Clock::time_point now) const;
+    using Filter = std::function<bool(const Connection&)>;
+    std::size_t count(const Filter& isCounted) const;
+    bool endOne(const Filter& mayEnd);
 
     const Limits& limits;
     mutable std::mutex mutex;
+    bool isClosed = false;
     std::list<Connection> connections;
 };
 

@@ -80,15 +80,6 @@ std::optional<HttpResponse> checkBody(const Headers& headers, std::size_t larges
     return std::nullopt;
 }
 
-/** The prefix of the extension's headers in an M-POST request; none if it has no extension for CIM operations. */
-std::optional<std::string> extensionPrefix(const Headers& headers) {
-    const std::string man = headerIn(headers, "Man").value_or("");
-    const std::string space = parameterOf(man, "ns");
-    const bool isCim = trimmed(man.substr(0, man.find(';'))) == mapping;
-    const bool isNumber = space.size() == 2 && space.find_first_not_of("0123456789") == std::string::npos;
-    return isCim && isNumber ? std::optional(space + "-") : std::nullopt;
-}
-
 std::optional<HttpResponse> checkProtocol(const Headers& headers, const std::string& prefix) {
     if (headers.count(prefix + "CIMBatch") != 0) {
         return refusal(501, "Several operations in one message are not supported.", "multiple-requests-unsupported");
@@ -110,7 +101,6 @@ std::optional<HttpResponse> checkProtocol(const Headers& headers, const std::str
 
 std::variant<CimHeaders, HttpResponse> cimHeaders(const Headers& headers, const std::string& prefix) {
     CimHeaders found;
-    found.extensionPrefix = prefix;
     for (const auto& [name, target] : {std::pair{"CIMMethod", &found.method}, std::pair{"CIMObject", &found.object}}) {
         const auto value = headerIn(headers, prefix + name);
         const auto decoded = value ? percentDecoded(*value) : std::nullopt;
@@ -154,6 +144,32 @@ std::optional<std::string> percentDecoded(const std::string& encoded) {
     return decoded;
 }
 
+std::string extensionPrefixOf(const HttpRequest& request) {
+    const std::string man = headerIn(request.headers, "Man").value_or("");
+    const std::string space = parameterOf(man, "ns");
+    const bool isCim = request.method == "M-POST" && trimmed(man.substr(0, man.find(';'))) == mapping;
+    const bool isNumber = space.size() == 2 && space.find_first_not_of("0123456789") == std::string::npos;
+    return isCim && isNumber ? space + "-" : std::string{};
+}
+
+Headers extensionHeaders(const std::string& prefix) {
+    // The HTTP library does not send a header without characters.
+    return {{"Ext", " "}, {"Man", std::string(mapping) + " ; ns=" + prefix.substr(0, 2)}};
+}
+
+HttpResponse withExtension(HttpResponse response, const std::string& prefix) {
+    if (prefix.empty()) {
+        return response;
+    }
+    const Headers additional = extensionHeaders(prefix);
+    response.headers.insert(additional.begin(), additional.end());
+    if (const auto error = headerIn(response.headers, "CIMError")) {
+        response.headers.erase("CIMError");
+        response.headers.emplace(prefix + "CIMError", *error);
+    }
+    return response;
+}
+
 std::variant<CimHeaders, HttpResponse> checkHeaders(const HttpRequest& request, const HeaderRules& rules) {
     const Headers& headers = request.headers;
     if (rules.requiresLocalHost && !isLocalHost(headerIn(headers, "Host").value_or(""))) {
@@ -170,13 +186,9 @@ std::variant<CimHeaders, HttpResponse> checkHeaders(const HttpRequest& request, 
         response.headers.emplace("Allow", permittedMethods);
         return response;
     }
-    std::string prefix;
-    if (request.method == "M-POST") {
-        const auto found = extensionPrefix(headers);
-        if (!found) {
-            return refusal(510, std::string("M-POST needs the header Man with ") + mapping + ".");
-        }
-        prefix = *found;
+    const std::string prefix = extensionPrefixOf(request);
+    if (prefix.empty() && request.method == "M-POST") {
+        return refusal(510, std::string("M-POST needs the header Man with ") + mapping + ".");
     }
     if (auto wrong = checkProtocol(headers, prefix)) {
         return *wrong;

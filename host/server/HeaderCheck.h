@@ -11,9 +11,8 @@ namespace cimhost::server {
 
 /** The headers of a CIM operation request that has passed the check. */
 struct CimHeaders {
-    std::string method{};           ///< CIMMethod
-    std::string object{};           ///< CIMObject, decoded
-    std::string extensionPrefix{};  ///< "NN-" for M-POST, else empty
+    std::string method{};  ///< CIMMethod
+    std::string object{};  ///< CIMObject, decoded
 };
 
 /** The conditions that depend on the listener. */
@@ -24,6 +23,16 @@ struct HeaderRules {
 
 /** Checks the head of a request. @return the headers of the operation, or the response that ends the request */
 std::variant<CimHeaders, HttpResponse> checkHeaders(const HttpRequest& request, const HeaderRules& rules);
+
+/** The prefix of the headers of an extension for CIM operations, "NN-", in an M-POST request; empty if there is none.
+ */
+std::string extensionPrefixOf(const HttpRequest& request);
+
+/** The headers with which a response confirms an extension. */
+Headers extensionHeaders(const std::string& prefix);
+
+/** Makes a refusal that of a request with an extension. @param prefix empty: without an extension */
+HttpResponse withExtension(HttpResponse response, const std::string& prefix);
 
 /** Whether a body agrees with the headers. @return the response that refuses it, or none */
 std::optional<HttpResponse> checkAgreement(const CimHeaders& headers, const cimxml::Message& message);

@@ -1,14 +1,12 @@
 #include "server/HttpServer.h"
 
-#include <arpa/inet.h>
-#include <netdb.h>
 #include <sys/socket.h>
 #include <unistd.h>
 
-#include <array>
 #include <atomic>
-#include <cerrno>
 #include <cstring>
+
+#include "server/Sockets.h"
 
 namespace cimhost::server {
 namespace {
@@ -18,65 +16,6 @@ constexpr std::size_t headSize = std::size_t{64} << 10U;  ///< of a request, wit
 
 /** Connections that the HTTP library may have besides the limit: those that are being ended for new ones. */
 constexpr std::size_t endingConnections = 128;
-
-/** The certificates for the callback of the TLS library, which has no argument for them. One server uses TLS. */
-std::atomic<const Certificates*> tlsCertificates{nullptr};
-
-int findCertificate(gnutls_session_t, const gnutls_datum_t*, int, const gnutls_pk_algorithm_t*, int,
-                    gnutls_pcert_st** certificates, unsigned* count, gnutls_privkey_t* key) {
-    const Certificates::Chain& chain = tlsCertificates.load()->current();
-    *certificates = const_cast<gnutls_pcert_st*>(chain.certificates.data());
-    *count = static_cast<unsigned>(chain.certificates.size());
-    *key = chain.key;
-    return 0;
-}
-
-std::string addressText(const sockaddr* address) {
-    std::array<char, NI_MAXHOST> host{};
-    std::array<char, NI_MAXSERV> port{};
-    const socklen_t size = address->sa_family == AF_INET6 ? sizeof(sockaddr_in6) : sizeof(sockaddr_in);
-    if (::getnameinfo(address, size, host.data(), host.size(), port.data(), port.size(),
-                      NI_NUMERICHOST | NI_NUMERICSERV) != 0) {
-        return "unknown";
-    }
-    const bool isSix = address->sa_family == AF_INET6;
-    return (isSix ? "[" : "") + std::string(host.data()) + (isSix ? "]:" : ":") + port.data();
-}
-
-/** Opens a listening socket. */
-int openSocket(const Listener& listener) {
-    addrinfo hints{};
-    hints.ai_flags = AI_PASSIVE | AI_NUMERICHOST | AI_NUMERICSERV;
-    hints.ai_socktype = SOCK_STREAM;
-    addrinfo* found = nullptr;
-    const int result = ::getaddrinfo(listener.address.c_str(), std::to_string(listener.port).c_str(), &hints, &found);
-    if (result != 0) {
-        throw SettingsError(listener.url() + ": " + ::gai_strerror(result));
-    }
-    const std::unique_ptr<addrinfo, decltype(&::freeaddrinfo)> address(found, &::freeaddrinfo);
-    const int socket = ::socket(found->ai_family, SOCK_STREAM | SOCK_CLOEXEC | SOCK_NONBLOCK, 0);
-    const int on = 1;
-    ::setsockopt(socket, SOL_SOCKET, SO_REUSEADDR, &on, sizeof on);
-    if (found->ai_family == AF_INET6) {
-        ::setsockopt(socket, IPPROTO_IPV6, IPV6_V6ONLY, &on, sizeof on);
-    }
-    if (socket < 0 || ::bind(socket, found->ai_addr, found->ai_addrlen) != 0 || ::listen(socket, SOMAXCONN) != 0) {
-        const std::string reason = std::strerror(errno);
-        ::close(socket);
-        throw SettingsError(listener.url() + ": " + reason);
-    }
-    return socket;
-}
-
-std::uint16_t portOf(int socket) {
-    sockaddr_storage address{};
-    socklen_t size = sizeof address;
-    if (::getsockname(socket, reinterpret_cast<sockaddr*>(&address), &size) != 0) {
-        return 0;
-    }
-    return ntohs(address.ss_family == AF_INET6 ? reinterpret_cast<const sockaddr_in6&>(address).sin6_port
-                                               : reinterpret_cast<const sockaddr_in&>(address).sin_port);
-}
 
 using Response = std::unique_ptr<MHD_Response, decltype(&MHD_destroy_response)>;
 
@@ -128,9 +67,9 @@ void addCimHeaders(MHD_Response* response, const std::string& prefix) {
     MHD_add_response_header(response, "Cache-Control", "no-cache");
     MHD_add_response_header(response, (prefix + "CIMOperation").c_str(), "MethodResponse");
     if (!prefix.empty()) {
-        MHD_add_response_header(response, "Ext", "");
-        const std::string man = "http://www.dmtf.org/cim/mapping/http/v1.0 ; ns=" + prefix.substr(0, 2);
-        MHD_add_response_header(response, "Man", man.c_str());
+        for (const auto& [name, value] : extensionHeaders(prefix)) {
+            MHD_add_response_header(response, name.c_str(), value.c_str());
+        }
     }
 }
 
@@ -157,6 +96,26 @@ struct HttpServer::Endpoint {
     MHD_Daemon* daemon = nullptr;
     bool isQuiet = false;
 
+    /** The server for the callbacks of the TLS library, which have no argument for it. One server uses TLS. */
+    static std::atomic<HttpServer*> tlsServer;
+
+    static int findCertificate(gnutls_session_t session, const gnutls_datum_t*, int, const gnutls_pk_algorithm_t*, int,
+                               gnutls_pcert_st** certificates, unsigned* count, gnutls_privkey_t* key) {
+        const Certificates::Chain& chain = tlsServer.load()->certificates->current();
+        *certificates = const_cast<gnutls_pcert_st*>(chain.certificates.data());
+        *count = static_cast<unsigned>(chain.certificates.size());
+        *key = chain.key;
+        gnutls_handshake_set_hook_function(session, GNUTLS_HANDSHAKE_FINISHED, GNUTLS_HOOK_POST, &noteHandshake);
+        return 0;
+    }
+
+    static int noteHandshake(gnutls_session_t session, unsigned, unsigned, unsigned isIncoming, const gnutls_datum_t*) {
+        if (isIncoming != 0) {
+            tlsServer.load()->table.endHandshake(gnutls_transport_get_int(session));
+        }
+        return 0;
+    }
+
     static Connection* connectionOf(MHD_Connection* connection) {
         const MHD_ConnectionInfo* info = MHD_get_connection_info(connection, MHD_CONNECTION_INFO_SOCKET_CONTEXT);
         return static_cast<Connection*>(info->socket_context);
@@ -167,16 +126,31 @@ struct HttpServer::Endpoint {
         auto& endpoint = *static_cast<Endpoint*>(self);
         if (code == MHD_CONNECTION_NOTIFY_STARTED) {
             const int socket = MHD_get_connection_info(connection, MHD_CONNECTION_INFO_CONNECTION_FD)->connect_fd;
-            *context = endpoint.server.table.add(socket, endpoint.listener.tls);
+            const sockaddr* client =
+                MHD_get_connection_info(connection, MHD_CONNECTION_INFO_CLIENT_ADDRESS)->client_addr;
+            *context =
+                endpoint.server.table.add(socket, endpoint.listener.tls, {addressText(client), networkOf(client)});
         } else {
-            endpoint.server.table.remove(static_cast<Connection*>(*context));
+            const auto& ended = *static_cast<Connection*>(*context);
+            if (ended.hasPartOfHead()) {
+                endpoint.server.handler.logIncomplete(ended);
+            }
+            endpoint.server.table.remove(&ended);
         }
     }
 
-    static void notifyCompleted(void*, MHD_Connection* connection, void** context, MHD_RequestTerminationCode) {
-        delete static_cast<Exchange*>(*context);
+    static void notifyCompleted(void* self, MHD_Connection*, void** context, MHD_RequestTerminationCode) {
+        const std::unique_ptr<Exchange> exchange(static_cast<Exchange*>(*context));
         *context = nullptr;
-        connectionOf(connection)->enter(Connection::Phase::idle);
+        const RequestHandler& handler = static_cast<Endpoint*>(self)->server.handler;
+        Connection& connection = *exchange->connection;
+        if (!exchange->isLogged) {
+            handler.logIncomplete(*exchange);
+        }
+        if (exchange->isBodyIgnored) {
+            discardInput(connection.socket(), handler.mostIgnored());
+        }
+        connection.enter(Connection::Phase::idle);
     }
 
     static MHD_Result handle(void* self, MHD_Connection* connection, const char*, const char* method, const char*,
@@ -201,28 +175,29 @@ struct HttpServer::Endpoint {
     MHD_Result begin(MHD_Connection* connection, const char* method, void** context) const {
         auto exchange = std::make_unique<Exchange>();
         exchange->connection = connectionOf(connection);
-        exchange->client =
-            addressText(MHD_get_connection_info(connection, MHD_CONNECTION_INFO_CLIENT_ADDRESS)->client_addr);
         exchange->needsAuthentication = server.settings.authenticates;
         exchange->rules = {!server.settings.authenticates, server.settings.limits.requestBytes};
         *context = exchange.get();
         Exchange& current = *exchange.release();  // notifyCompleted deletes it
-        current.connection->enter(Connection::Phase::work);
-        const auto refused = server.handler.begin(current, headOf(connection, method));
-        if (refused) {
+        current.connection->enter(Connection::Phase::check);
+        if (const auto refused = server.handler.begin(current, headOf(connection, method))) {
+            current.connection->enter(Connection::Phase::refusal);
             return send(connection, current, *refused);
         }
-        current.connection->enter(Connection::Phase::body);
-        return MHD_YES;
+        return current.connection->enter(Connection::Phase::body) ? MHD_YES : MHD_NO;
     }
 
     MHD_Result finish(MHD_Connection* connection, Exchange& exchange) const {
+        if (!exchange.connection->enter(Connection::Phase::work)) {
+            return MHD_NO;
+        }
         const Reply reply = server.handler.finish(exchange);
+        exchange.connection->enter(Connection::Phase::response);
         if (const auto* refused = std::get_if<HttpResponse>(&reply)) {
             return send(connection, exchange, *refused);
         }
         const Response response = textResponse(std::get<std::shared_ptr<cimxml::ResponseText>>(reply));
-        addCimHeaders(response.get(), exchange.headers.extensionPrefix);
+        addCimHeaders(response.get(), exchange.extensionPrefix);
         return queue(connection, exchange, response, MHD_HTTP_OK);
     }
 
@@ -235,10 +210,9 @@ struct HttpServer::Endpoint {
     }
 
     MHD_Result queue(MHD_Connection* connection, Exchange& exchange, const Response& response, unsigned status) const {
-        if (server.handler.isStopping()) {
+        if (server.handler.isStopping() || exchange.isBodyIgnored) {
             MHD_add_response_header(response.get(), "Connection", "close");
         }
-        exchange.connection->enter(Connection::Phase::response);
         server.handler.log(exchange, status);
         return MHD_queue_response(connection, status, response.get());
     }
@@ -267,10 +241,13 @@ struct HttpServer::Endpoint {
         }
     }
 
+    /** Accepts no more connections. A socket of the service manager remains open for the next process. */
     void quiesce() {
         if (daemon != nullptr && !isQuiet) {
             MHD_quiesce_daemon(daemon);
-            ::close(socket);
+            if (listener.descriptor < 0) {
+                ::shutdown(socket, SHUT_RDWR);
+            }
             isQuiet = true;
         }
     }
@@ -279,16 +256,17 @@ struct HttpServer::Endpoint {
         quiesce();
         if (daemon != nullptr) {
             MHD_stop_daemon(daemon);
-        } else {
-            ::close(socket);
         }
+        ::close(socket);  // the HTTP library may have used it until now
     }
 };
+
+std::atomic<HttpServer*> HttpServer::Endpoint::tlsServer{nullptr};
 
 HttpServer::HttpServer(const Settings& itsSettings, RequestHandler& itsHandler, const Certificates* itsCertificates)
     : settings(itsSettings), handler(itsHandler), certificates(itsCertificates), table(itsSettings.limits) {
     if (certificates != nullptr) {
-        tlsCertificates = certificates;
+        Endpoint::tlsServer = this;
     }
     for (const Listener& each : settings.listeners) {
         listen(each);
@@ -306,7 +284,7 @@ HttpServer::~HttpServer() {
     for (const auto& each : endpoints) {
         each->quiesce();
     }
-    table.endAll(true);
+    table.endAll();
     endpoints.clear();
 }
 
@@ -336,11 +314,20 @@ void HttpServer::watch() {
 }
 
 bool HttpServer::drain(std::chrono::milliseconds time) {
-    constexpr std::chrono::milliseconds period{20};
+    constexpr std::chrono::seconds endingTime{2};
     handler.stop();
     for (const auto& each : endpoints) {
         each->quiesce();
     }
+    if (isIdleWithin(time)) {
+        return true;
+    }
+    table.endAll();
+    return isIdleWithin(endingTime);
+}
+
+bool HttpServer::isIdleWithin(std::chrono::milliseconds time) const {
+    constexpr std::chrono::milliseconds period{20};
     const auto end = std::chrono::steady_clock::now() + time;
     while (table.busy() != 0 && std::chrono::steady_clock::now() < end) {
         std::this_thread::sleep_for(period);

@@ -38,8 +38,9 @@ public:
     std::vector<Listener> listeners() const;
 
     /**
-     * Accepts no more connections and requests, and waits for the requests that run.
-     * @return false if some still run after the time
+     * Accepts no more connections and requests, and waits for the requests that run. After the time, ends the
+     * connections of clients that are still sending or receiving.
+     * @return false if operations still run then
      */
     bool drain(std::chrono::milliseconds time);
 
@@ -50,6 +51,7 @@ private:
 
     void listen(const Listener& listener);
     void watch();
+    bool isIdleWithin(std::chrono::milliseconds time) const;
 
     const Settings& settings;
     RequestHandler& handler;

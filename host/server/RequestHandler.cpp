@@ -1,13 +1,13 @@
 #include "server/RequestHandler.h"
 
-#include <thread>
-
 #include "cimxml/Errors.h"
 
 namespace cimhost::server {
 namespace {
 
 constexpr std::chrono::seconds authorizationLifetime{60};
+constexpr unsigned badRequest = 400;
+constexpr unsigned timeout = 408;
 constexpr std::size_t patience = 4;  ///< multiple of the largest request that is received although it is refused
 
 HttpResponse unauthorized() {
@@ -32,17 +32,12 @@ RequestHandler::RequestHandler(const Settings& itsSettings, cimxml::Operations& 
       accessLog(itsLog),
       slots(itsSettings.limits.requestsAtWork) {}
 
-/**
- * A client that is still sending may lose a response that it receives before it has sent the body, since the connection
- * ends. So the response waits, unless the client itself waits or would send many times too much.
- */
 std::optional<HttpResponse> RequestHandler::begin(Exchange& exchange, const HttpRequest& request) {
-    exchange.refused = check(exchange, request);
-    const std::string length = headerIn(request.headers, "Content-Length").value_or("");
-    const bool isShort = !length.empty() && length.size() < 10 && length.find_first_not_of("0123456789") == length.npos;
-    const bool isAwaited = isShort && std::stoul(length) <= patience * settings.limits.requestBytes &&
-                           request.headers.count("Expect") == 0 && request.headers.count("Transfer-Encoding") == 0;
-    return isAwaited ? std::nullopt : exchange.refused;
+    const std::string length = headerIn(request.headers, "Content-Length").value_or("0");
+    exchange.extensionPrefix = extensionPrefixOf(request);
+    auto refused = check(exchange, request);
+    exchange.isBodyIgnored = refused && (length != "0" || request.headers.count("Transfer-Encoding") != 0);
+    return refused ? std::optional(withExtension(*refused, exchange.extensionPrefix)) : std::nullopt;
 }
 
 std::optional<HttpResponse> RequestHandler::check(Exchange& exchange, const HttpRequest& request) {
@@ -67,9 +62,11 @@ std::optional<HttpResponse> RequestHandler::authenticate(Exchange& exchange, con
     exchange.record.user = credentials->user;
     const Right right = verified(exchange, *authorization);
     if (right == Right::none) {
-        std::this_thread::sleep_for(settings.limits.failureDelay);
+        exchange.connection->enter(Connection::Phase::refusal);
+        exchange.connection->wait(settings.limits.failureDelay);
         return unauthorized();
     }
+    exchange.connection->trust();
     exchange.caller = {credentials->user, right == Right::write};
     return std::nullopt;
 }
@@ -100,14 +97,26 @@ bool RequestHandler::receive(Exchange& exchange, const char* data, std::size_t s
         return true;
     }
     exchange.ignored += size;
-    return exchange.ignored <= patience * settings.limits.requestBytes;
+    return exchange.ignored <= mostIgnored();
+}
+
+std::size_t RequestHandler::mostIgnored() const {
+    return patience * settings.limits.requestBytes;
 }
 
 Reply RequestHandler::finish(Exchange& exchange) {
+    Reply reply = answer(exchange);
+    if (auto* refused = std::get_if<HttpResponse>(&reply)) {
+        return withExtension(std::move(*refused), exchange.extensionPrefix);
+    }
+    return reply;
+}
+
+Reply RequestHandler::answer(Exchange& exchange) {
     if (exchange.refused) {
         return *exchange.refused;
     }
-    exchange.connection->enter(Connection::Phase::work);
+    exchange.connection->trust();
     const RequestSlots::Held slot(slots, settings.limits.queueTime);
     if (!slot) {
         return unavailable("The server has too many requests.");
@@ -122,6 +131,7 @@ Reply RequestHandler::finish(Exchange& exchange) {
 Reply RequestHandler::perform(Exchange& exchange) {
     cimxml::XmlLimits limits;
     limits.depth = settings.limits.xmlDepth;
+    limits.elements = settings.limits.xmlElements;
     const cimxml::Message message = cimxml::readMessage(exchange.body, limits);
     exchange.body = {};
     if (auto disagreement = checkAgreement(exchange.headers, message)) {
@@ -146,11 +156,24 @@ Reply RequestHandler::perform(Exchange& exchange) {
 }
 
 void RequestHandler::log(Exchange& exchange, unsigned httpStatus) const {
-    exchange.record.client = exchange.client;
+    exchange.isLogged = true;
+    exchange.record.client = exchange.connection->client().address;
     exchange.record.httpStatus = httpStatus;
     exchange.record.duration =
         std::chrono::duration_cast<std::chrono::microseconds>(std::chrono::steady_clock::now() - exchange.start);
     accessLog.write(exchange.record);
+}
+
+void RequestHandler::logIncomplete(Exchange& exchange) const {
+    const bool hasTimedOut = exchange.connection->hasTimedOut();
+    log(exchange, hasTimedOut ? timeout : exchange.refused ? exchange.refused->status : badRequest);
+}
+
+void RequestHandler::logIncomplete(const Connection& connection) const {
+    AccessRecord record;
+    record.client = connection.client().address;
+    record.httpStatus = connection.hasTimedOut() ? timeout : badRequest;
+    accessLog.write(record);
 }
 
 }  // namespace cimhost::server

@@ -21,14 +21,16 @@ namespace cimhost::server {
 /** One HTTP request and its response, from its head to the end of its response. */
 struct Exchange {
     HeaderRules rules{};
-    std::string client{};  ///< its address and port
     Connection* connection = nullptr;
     bool needsAuthentication = true;
-    CimHeaders headers{};  ///< of a request that has passed the checks
+    CimHeaders headers{};           ///< of a request that has passed the checks
+    std::string extensionPrefix{};  ///< of the headers of an M-POST request, else empty
     cimxml::Caller caller{};
     std::string body{};
-    std::optional<HttpResponse> refused{};  ///< the response, once the body, which is ignored, has arrived
-    std::size_t ignored = 0;                ///< bytes of the body
+    bool isBodyIgnored = false;             ///< whether the response is sent before the body has arrived
+    std::optional<HttpResponse> refused{};  ///< the response to a body that is too large, once its rest has arrived
+    std::size_t ignored = 0;                ///< bytes of the rest
+    bool isLogged = false;
     AccessRecord record{};
     std::chrono::steady_clock::time_point start = std::chrono::steady_clock::now();
 };
@@ -51,8 +53,15 @@ public:
     /** Performs the complete request. */
     Reply finish(Exchange& exchange);
 
+    /** Largest number of bytes that are received although they are ignored. */
+    std::size_t mostIgnored() const;
+
     /** Writes the access log line. */
     void log(Exchange& exchange, unsigned httpStatus) const;
+
+    /** Writes the line of a request that has ended before its response: because of the client, or of its duration. */
+    void logIncomplete(Exchange& exchange) const;
+    void logIncomplete(const Connection& connection) const;
 
     /** Ends open enumerations whose timeout has passed. */
     void removeExpired() { operations.removeExpired(); }
@@ -65,6 +74,7 @@ private:
     std::optional<HttpResponse> check(Exchange& exchange, const HttpRequest& request);
     std::optional<HttpResponse> authenticate(Exchange& exchange, const HttpRequest& request);
     Right verified(Exchange& exchange, const std::string& authorization);
+    Reply answer(Exchange& exchange);
     Reply perform(Exchange& exchange);
 
     const Settings& settings;

@@ -60,13 +60,14 @@ void reload(Certificates* certificates, AccessLog& log) {
     ::sd_notify(0, "READY=1");
 }
 
-/** @return whether all requests have ended */
+/** @return whether all operations have ended */
 bool stop(HttpServer& server, const Limits& limits, const AccessLog& log) {
     ::sd_notify(0, "STOPPING=1");
     log.write("stopping");
     const bool isIdle = server.drain(limits.stopTime);
     if (!isIdle) {
-        log.write("requests still run after " + std::to_string(limits.stopTime.count()) + " seconds");
+        log.write("operations still run after " + std::to_string(limits.stopTime.count()) +
+                  " seconds; the server ends without cleaning up the providers");
     }
     return isIdle;
 }

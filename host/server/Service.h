@@ -18,7 +18,7 @@ std::vector<Listener> activatedListeners();
 
 /**
  * Serves requests until SIGTERM or SIGINT. SIGHUP reads the certificates again and reopens the access log. Reports its
- * state to the service manager. Requests that still run when the time to stop is over end with the process.
+ * state to the service manager. Operations that still run when the time to stop is over end with the process.
  * @param announce receives a line for each address
  * @throws SettingsError
  */

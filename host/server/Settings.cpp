@@ -28,9 +28,11 @@ void readSeconds(TableReader& table, const char* key, std::chrono::seconds& targ
 
 void readLimits(TableReader table, Limits& limits) {
     readNumber(table, "connections", limits.connections, 100'000);
+    readNumber(table, "connections_per_address", limits.connectionsPerAddress, 100'000);
     readNumber(table, "requests_at_work", limits.requestsAtWork, 10'000);
     readNumber(table, "request_bytes", limits.requestBytes, std::int64_t{1} << 30U);
     readNumber(table, "xml_depth", limits.xmlDepth, 200);
+    readNumber(table, "xml_elements", limits.xmlElements, 10'000'000);
     readNumber(table, "open_enumerations", limits.enumerations.open, 1'000'000);
     readSeconds(table, "queue_seconds", limits.queueTime);
     readSeconds(table, "head_seconds", limits.headTime);

@@ -31,10 +31,12 @@ struct AccessRules {
 
 struct Limits {
     std::size_t connections = 256;
+    std::size_t connectionsPerAddress = 192;  ///< of one network, see networkOf()
     std::size_t requestsAtWork = 32;
     std::chrono::seconds queueTime{30};  ///< how long a request waits for others at work
     std::size_t requestBytes = std::size_t{4} << 20U;
     std::size_t xmlDepth = 64;
+    std::size_t xmlElements = 50'000;
     std::chrono::seconds headTime{10};             ///< from the first byte of a request to the end of its head
     std::chrono::seconds bodyTime{30};             ///< for the body of a request
     std::chrono::seconds responseTime{300};        ///< until the client has taken the response

@@ -105,5 +105,12 @@ TEST_F(ClassOperationsTest, AssociationsOfClassesComeFromTheSchema) {
     EXPECT_THAT(manager.requests, IsEmpty());
 }
 
+TEST_F(ClassOperationsTest, ClassesWithControlCharactersAreWellFormed) {
+    MofReader(schema).readSource("[Description(\"a\\x1b\\x0D\")] class Odd { [Key] string Name = \"\\x1\"; };", "odd");
+    const XmlElement got = response("GetClass", className("ClassName", "Odd"));
+    ASSERT_EQ(statusOf(got), 0);
+    EXPECT_EQ(returned(got)[0].children[0].children[0].characters, "a\xEF\xBF\xBD\r");
+}
+
 }  // namespace
 }  // namespace cimhost::cimxml::test

@@ -59,7 +59,51 @@ TEST_F(InstanceOperationsTest, ClassOriginIsWrittenOnRequest) {
 TEST_F(InstanceOperationsTest, ClassesWithoutProvidersHaveNoInstances) {
     EXPECT_THAT(returned(response("EnumerateInstances", className("ClassName", "Unserved"))), IsEmpty());
     EXPECT_EQ(statusOf(response("EnumerateInstances", className("ClassName", "Nothing"))), CMPI_RC_ERR_INVALID_CLASS);
+    const std::string path = instanceName("Unserved", "a");
+    const std::string instance = "<INSTANCE CLASSNAME=\"Unserved\"></INSTANCE>";
+    EXPECT_EQ(statusOf(response("GetInstance", parameter("InstanceName", path))), CMPI_RC_ERR_NOT_FOUND);
+    EXPECT_EQ(statusOf(response("DeleteInstance", parameter("InstanceName", path))), CMPI_RC_ERR_NOT_SUPPORTED);
+    EXPECT_EQ(statusOf(response("CreateInstance", parameter("NewInstance", instance))), CMPI_RC_ERR_NOT_SUPPORTED);
+    EXPECT_EQ(
+        statusOf(response("ModifyInstance", parameter("ModifiedInstance", "<VALUE.NAMEDINSTANCE>" + path + instance +
+                                                                              "</VALUE.NAMEDINSTANCE>"))),
+        CMPI_RC_ERR_NOT_SUPPORTED);
     EXPECT_THAT(manager.requests, IsEmpty());
+}
+
+TEST_F(InstanceOperationsTest, ThereAreFewParametersPropertiesAndKeys) {
+    const std::string twice = className("ClassName", "Base") + className("classname", "Base");
+    EXPECT_EQ(statusOf(response("EnumerateInstances", twice)), CMPI_RC_ERR_INVALID_PARAMETER);
+    std::string keys;
+    std::string sent;
+    std::vector<std::string> names;
+    for (int i = 0; i <= 1000; ++i) {
+        const std::string name = "P" + std::to_string(i);
+        keys += "<KEYBINDING NAME=\"" + name + "\"><KEYVALUE>a</KEYVALUE></KEYBINDING>";
+        sent += "<PROPERTY NAME=\"" + name + "\" TYPE=\"string\"></PROPERTY>";
+        names.push_back(name);
+    }
+    const auto error = [&](const std::string& operation, const std::string& parameters) {
+        return *response(operation, parameters).child("ERROR")->attribute("DESCRIPTION");
+    };
+    EXPECT_THAT(error("EnumerateInstances", className("ClassName", "Base") + properties(names)),
+                HasSubstr("VALUE.ARRAY has more than 1000 elements"));
+    EXPECT_THAT(
+        error("GetInstance", parameter("InstanceName", "<INSTANCENAME CLASSNAME=\"Base\">" + keys + "</INSTANCENAME>")),
+        HasSubstr("INSTANCENAME has more than 1000 elements"));
+    EXPECT_THAT(
+        error("CreateInstance", parameter("NewInstance", "<INSTANCE CLASSNAME=\"Base\">" + sent + "</INSTANCE>")),
+        HasSubstr("INSTANCE has more than 1000 elements"));
+    EXPECT_THAT(manager.requests, IsEmpty());
+}
+
+TEST_F(InstanceOperationsTest, CharactersThatXmlCannotRepresentAreAnError) {
+    manager.answer = [](const Request&) {
+        return Response::ofInstances({instanceOf("Other", "a", {{"Letter", Value::of(CMPI_char16, Char16{1})}})});
+    };
+    const XmlElement failed = response("EnumerateInstances", className("ClassName", "Other"));
+    ASSERT_EQ(statusOf(failed), CMPI_RC_ERR_FAILED);
+    EXPECT_THAT(*failed.child("ERROR")->attribute("DESCRIPTION"), HasSubstr("Other.Letter"));
 }
 
 TEST_F(InstanceOperationsTest, AllTypesOfValuesAreWritten) {

@@ -53,7 +53,6 @@ TEST_F(MessageTest, RefusesWhatIsNotARequest) {
     EXPECT_EQ(refusalOf(replaced(valid, "ID=\"42\" ", "")), "400 request-not-loosely-valid");
     EXPECT_EQ(refusalOf(replaced(valid, "<NAMESPACE NAME=\"root\"/><NAMESPACE NAME=\"test\"/>", "")),
               "400 request-not-loosely-valid");
-    EXPECT_EQ(refusalOf(request("X", value("A", "1") + value("a", "2"))), "400 request-not-valid");
 }
 
 TEST_F(MessageTest, RefusesSeveralOperationsAndExports) {

@@ -135,9 +135,18 @@ TEST_F(HeaderCheckTest, ExtensionRequestsHavePrefixedHeaders) {
     with("73-CIMOperation", "MethodCall").with("73-CIMMethod", "GetClass").with("73-CIMObject", "root");
     const auto checked = check();
     ASSERT_TRUE(std::holds_alternative<CimHeaders>(checked));
-    EXPECT_EQ(std::get<CimHeaders>(checked).extensionPrefix, "73-");
+    EXPECT_EQ(extensionPrefixOf(request), "73-");
     EXPECT_EQ(std::get<CimHeaders>(checked).object, "root");
     EXPECT_EQ(with("Man", "http://example.com/other ; ns=73").result(), "510");
+}
+
+TEST_F(HeaderCheckTest, RefusalsOfExtensionRequestsHavePrefixedHeaders) {
+    const HttpResponse response = withExtension(refusal(400, "why", "header-mismatch"), "73-");
+    EXPECT_EQ(headerIn(response.headers, "73-CIMError"), "header-mismatch");
+    EXPECT_EQ(headerIn(response.headers, "Man"), "http://www.dmtf.org/cim/mapping/http/v1.0 ; ns=73");
+    EXPECT_EQ(response.headers.count("Ext"), 1U);
+    EXPECT_EQ(response.headers.count("CIMError"), 0U);
+    EXPECT_EQ(withExtension(refusal(400, "why", "header-mismatch"), "").headers.count("CIMError"), 1U);
 }
 
 TEST(HeaderAgreementTest, HeadersMustAgreeWithTheBody) {
@@ -145,7 +154,7 @@ TEST(HeaderAgreementTest, HeadersMustAgreeWithTheBody) {
     message.method = "GetClass";
     message.object = "root/cimv2";
     const auto agrees = [&](const std::string& method, const std::string& object) {
-        return !checkAgreement({method, object, ""}, message);
+        return !checkAgreement({method, object}, message);
     };
     EXPECT_TRUE(agrees("GetClass", "root/cimv2"));
     EXPECT_TRUE(agrees("getclass", "ROOT/cimv2"));

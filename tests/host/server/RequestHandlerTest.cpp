@@ -3,75 +3,15 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "schema/MofReader.h"
-#include "support/Files.h"
+#include "ServerFixture.h"
 
 using namespace cimhost;
 using namespace cimhost::server;
 
 namespace {
 
-/** Counts how often it is asked, and accepts one password. */
-class FakeAuthenticator : public Authenticator {
-public:
-    bool accepts(const Credentials& credentials) override {
-        ++asked;
-        return credentials.password == "right";
-    }
-    int asked = 0;
-};
-
-/** Keeps the principal of the last request. */
-class FakeManager : public UpCalls {
-public:
-    Response perform(Request request) override {
-        principal = std::get<std::string>(request.context.at(0).value.single);
-        return {};
-    }
-    std::string principal{};
-};
-
-class RequestHandlerTest : public testing::Test {
+class RequestHandlerTest : public cimhost::server::test::ServerTest {
 protected:
-    RequestHandlerTest() {
-        MofReader(schema).readSource("class Thing { [Key] string Name; };", "test class");
-        registry.add({"Thing", "Test", "Test", true, false, {"root/test"}, "", "", ""});
-        settings.access = {{"reader"}, {"writer"}};
-        settings.limits.failureDelay = std::chrono::milliseconds(0);
-        settings.limits.requestBytes = 2000;
-    }
-
-    RequestHandler& handler() {
-        if (!started) {
-            operations = std::make_unique<cimxml::Operations>(schema, registry, manager,
-                                                              cimxml::OperationsOptions{"host", "1", {}});
-            started = std::make_unique<RequestHandler>(settings, *operations, authenticator, log);
-        }
-        return *started;
-    }
-
-    static HttpRequest head(const std::string& operation, const std::string& authorization = "") {
-        HttpRequest request{"POST",
-                            {{"Host", "localhost"},
-                             {"Content-Type", "text/xml"},
-                             {"CIMOperation", "MethodCall"},
-                             {"CIMMethod", operation},
-                             {"CIMObject", "root/test"}}};
-        if (!authorization.empty()) {
-            request.headers.emplace("Authorization", "Basic " + authorization);
-        }
-        return request;
-    }
-
-    static std::string body(const std::string& operation, const std::string& parameter, const std::string& value) {
-        return "<CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\"><MESSAGE ID=\"1\" PROTOCOLVERSION=\"1.0\"><SIMPLEREQ>"
-               "<IMETHODCALL NAME=\"" +
-               operation +
-               "\"><LOCALNAMESPACEPATH><NAMESPACE NAME=\"root\"/><NAMESPACE NAME=\"test\"/></LOCALNAMESPACEPATH>"
-               "<IPARAMVALUE NAME=\"" +
-               parameter + "\">" + value + "</IPARAMVALUE></IMETHODCALL></SIMPLEREQ></MESSAGE></CIM>";
-    }
-
     /** The HTTP and the CIM status of a request. */
     std::string status(const HttpRequest& request, const std::string& content) {
         Exchange exchange;
@@ -100,21 +40,7 @@ protected:
                            "<INSTANCENAME CLASSNAME=\"Thing\"><KEYVALUE>a</KEYVALUE></INSTANCENAME>"));
     }
 
-    const std::string reader = "cmVhZGVyOnJpZ2h0";        // reader:right
-    const std::string writer = "d3JpdGVyOnJpZ2h0";        // writer:right
-    const std::string wrong = "d3JpdGVyOndyb25n";         // writer:wrong
-    const std::string stranger = "c3RyYW5nZXI6cmlnaHQ=";  // stranger:right
-
-    testsupport::TempDirectory directory;
-    Schema schema;
-    ProviderRegistry registry;
-    FakeManager manager;
-    FakeAuthenticator authenticator;
-    Settings settings;
-    AccessLog log{directory.path() / "log"};
     Connection connection{-1, false};
-    std::unique_ptr<cimxml::Operations> operations;
-    std::unique_ptr<RequestHandler> started;
 };
 
 TEST_F(RequestHandlerTest, UsersNeedAPasswordAndARight) {
@@ -144,14 +70,31 @@ TEST_F(RequestHandlerTest, APasswordIsCheckedOncePerConnection) {
     EXPECT_EQ(authenticator.asked, 5);
 }
 
-TEST_F(RequestHandlerTest, ARefusalWaitsForTheBodyOfAClientThatDoesNotWait) {
-    HttpRequest request = head("EnumerateInstanceNames");
+TEST_F(RequestHandlerTest, ARefusalDoesNotWaitForTheBody) {
+    for (const auto& [name, value, isIgnored] : {std::tuple{"Content-Length", "100", true},
+                                                 {"Content-Length", "0", false},
+                                                 {"Transfer-Encoding", "chunked", true},
+                                                 {"Accept", "*/*", false}}) {
+        HttpRequest request = head("EnumerateInstanceNames");
+        Exchange exchange;
+        exchange.connection = &connection;
+        exchange.rules.largestBody = 1000;
+        request.headers.emplace(name, value);
+        const auto refused = handler().begin(exchange, request);
+        ASSERT_TRUE(refused);
+        EXPECT_EQ(refused->status, 401U);
+        EXPECT_EQ(exchange.isBodyIgnored, isIgnored) << name << value;
+    }
+}
+
+TEST_F(RequestHandlerTest, RequestsThatEndBeforeTheirResponseAreLogged) {
     Exchange exchange;
     exchange.connection = &connection;
-    request.headers.emplace("Content-Length", "100");
-    EXPECT_FALSE(handler().begin(exchange, request));
-    request.headers.emplace("Expect", "100-continue");
-    EXPECT_TRUE(handler().begin(exchange, request));
+    handler().begin(exchange, head("EnumerateInstanceNames", reader));
+    handler().logIncomplete(exchange);
+    handler().logIncomplete(connection);
+    EXPECT_THAT(testsupport::readFile(directory.path() / "log"),
+                testing::ContainsRegex(" reader EnumerateInstanceNames - 400/0 0 .*\n.* - - - 400/0 0 0.000\n$"));
 }
 
 TEST_F(RequestHandlerTest, BodiesThatAreTooLargeAreIgnoredUpToALimit) {

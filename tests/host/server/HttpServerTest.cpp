@@ -1,0 +1,214 @@
+#include "server/HttpServer.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <future>
+#include <list>
+
+#include "ServerFixture.h"
+#include "TcpPair.h"
+
+using namespace cimhost;
+using namespace cimhost::server;
+using namespace std::chrono_literals;
+using cimhost::server::test::connectTo;
+using cimhost::server::test::Socket;
+using testing::HasSubstr;
+using testing::StartsWith;
+
+namespace {
+
+class HttpServerTest : public test::ServerTest {
+protected:
+    HttpServerTest() {
+        settings.listeners.push_back({"127.0.0.1", 0, false, -1});
+        settings.limits.connections = 10;
+        settings.limits.connectionsPerAddress = 10;
+        settings.limits.failureDelay = 1h;  // for as long as a test takes
+    }
+
+    HttpServer& server() {
+        if (!running) {
+            running = std::make_unique<HttpServer>(settings, handler(), nullptr);
+        }
+        return *running;
+    }
+
+    Socket connect() { return connectTo(server().listeners().front().port); }
+
+    /** A request with a header Content-Length, and the complete body or none. */
+    std::string requestOf(const std::string& credentials, bool hasBody = true) const {
+        const std::string content = body("EnumerateInstances", "ClassName", "<CLASSNAME NAME=\"Thing\"/>");
+        std::string text = "POST /cimom HTTP/1.1\r\n";
+        for (const auto& [name, value] : head("EnumerateInstances", credentials).headers) {
+            text += name + ": " + value + "\r\n";
+        }
+        return text + "Content-Length: " + std::to_string(content.size()) + "\r\n\r\n" + (hasBody ? content : "");
+    }
+
+    /** The response to a client with a right password, on an open connection. */
+    std::string served(const Socket& client) const {
+        client.send(requestOf(reader));
+        return client.receiveUntil("</CIM>\n");
+    }
+
+    /** More than the buffers of both sockets take. */
+    static Response largeResponse() {
+        Instance instance{{"", "root/test", "Thing", {{"Name", Value::of(std::string(20'000, 'a'))}}}, {}};
+        return Response::ofInstances(std::vector<Instance>(2'000, instance));
+    }
+
+    /** A client that has begun to receive a large response, and stops. */
+    Socket slowReader() {
+        Socket client = connect();
+        client.send(requestOf(reader));
+        EXPECT_THAT(client.receiveUntil("\r\n\r\n"), StartsWith("HTTP/1.1 200 "));
+        return client;
+    }
+
+    std::string log() const { return testsupport::readFile(directory.path() / "log"); }
+
+    std::unique_ptr<HttpServer> running;
+};
+
+TEST_F(HttpServerTest, AFloodOfHalfRequestsLeavesOthersServed) {
+    const Socket connected = connect();
+    EXPECT_THAT(served(connected), StartsWith("HTTP/1.1 200 "));
+    std::list<Socket> flood;
+    for (int i = 0; i < 300; ++i) {
+        flood.push_back(connect());
+        flood.back().send(i % 2 == 0 ? "POST / HT" : requestOf("", false));
+        if (i % 50 == 0) {
+            EXPECT_THAT(served(connect()), StartsWith("HTTP/1.1 200 "));
+            EXPECT_THAT(served(connected), StartsWith("HTTP/1.1 200 "));
+        }
+    }
+}
+
+TEST_F(HttpServerTest, AFloodOfBodiesThatDoNotArriveLeavesOthersServed) {
+    settings.authenticates = false;
+    const Socket connected = connect();
+    EXPECT_THAT(served(connected), StartsWith("HTTP/1.1 200 "));
+    std::list<Socket> flood;
+    for (int i = 0; i < 300; ++i) {
+        flood.push_back(connect());
+        flood.back().send(requestOf("", false));
+        if (i % 50 == 0) {
+            EXPECT_THAT(served(connect()), StartsWith("HTTP/1.1 200 "));
+            EXPECT_THAT(served(connected), StartsWith("HTTP/1.1 200 "));
+        }
+    }
+}
+
+TEST_F(HttpServerTest, AFloodOfWrongPasswordsLeavesOthersServed) {
+    const Socket connected = connect();
+    EXPECT_THAT(served(connected), StartsWith("HTTP/1.1 200 "));
+    std::list<Socket> flood;
+    for (int i = 0; i < 300; ++i) {
+        flood.push_back(connect());
+        flood.back().send(requestOf(wrong));
+        if (i % 50 == 0) {
+            EXPECT_THAT(served(connect()), StartsWith("HTTP/1.1 200 "));
+            EXPECT_THAT(served(connected), StartsWith("HTTP/1.1 200 "));
+        }
+    }
+}
+
+TEST_F(HttpServerTest, AFloodOfSlowReadersLeavesOthersServed) {
+    manager.answerWith([](const Request&) { return largeResponse(); });
+    std::list<Socket> flood;
+    for (std::size_t i = 0; i < settings.limits.connections; ++i) {
+        flood.push_back(slowReader());
+    }
+    manager.answerWith([](const Request&) { return Response{}; });
+    const auto end = std::chrono::steady_clock::now() + 60s;
+    std::string response;
+    while (response.empty() && std::chrono::steady_clock::now() < end) {  // until a slow reader makes no progress
+        response = served(connect());
+    }
+    EXPECT_THAT(response, StartsWith("HTTP/1.1 200 "));
+}
+
+TEST_F(HttpServerTest, AMissingPasswordIsRefusedBeforeTheBodyArrives) {
+    const Socket client = connect();
+    client.send(requestOf("", false));
+    EXPECT_THAT(client.receiveUntil("\r\n\r\n"),
+                testing::AllOf(StartsWith("HTTP/1.1 401 "), HasSubstr("WWW-Authenticate: Basic "),
+                               HasSubstr("Connection: close")));
+}
+
+TEST_F(HttpServerTest, ARefusalReachesAClientThatSendsItsBodyFirst) {
+    settings.limits.requestBytes = std::size_t{1} << 20U;
+    for (int i = 0; i < 20; ++i) {
+        const Socket client = connect();
+        std::string request = requestOf("", false);
+        request.replace(request.find("Content-Length: ") + 16, 0, "1000");  // one million and more
+        client.send(request);
+        client.send(std::string(1'000'000, ' '));
+        EXPECT_THAT(client.receiveUntil("\r\n\r\n"), StartsWith("HTTP/1.1 4"));
+    }
+}
+
+TEST_F(HttpServerTest, IdleConnectionsEnd) {
+    settings.limits.idleTime = 1s;
+    const Socket client = connect();
+    EXPECT_THAT(served(client), StartsWith("HTTP/1.1 200 "));
+    EXPECT_EQ(client.receive(), "");
+}
+
+TEST_F(HttpServerTest, IncompleteRequestsAreLogged) {
+    settings.limits.bodyTime = 1s;
+    const Socket slow = connect();
+    slow.send(requestOf(reader, false));
+    EXPECT_THAT(slow.receive(), StartsWith("HTTP/1.1 408 "));
+    const Socket wrongHead = connect();
+    wrongHead.send("NONSENSE\r\n\r\n");
+    wrongHead.receive();
+    const Socket longHead = connect();
+    longHead.send("POST / HTTP/1.1\r\nX: " + std::string(100'000, 'a') + "\r\n\r\n");
+    longHead.receive();
+    const Socket closed = connect();
+    EXPECT_THAT(served(closed), StartsWith("HTTP/1.1 200 "));
+    running.reset();
+    EXPECT_THAT(log(), HasSubstr(" reader EnumerateInstances - 408/0 0 "));
+    EXPECT_THAT(log(), testing::ContainsRegex("( - - - 4../0 0 .*\n.*){2}"));
+    const std::string lines = log();
+    EXPECT_EQ(std::count(lines.begin(), lines.end(), '\n'), 4) << lines;
+}
+
+TEST_F(HttpServerTest, StopEndsSlowReadersAfterTheTime) {
+    manager.answerWith([](const Request&) { return largeResponse(); });
+    const Socket reading = slowReader();
+    EXPECT_TRUE(server().drain(0s));
+    reading.receive();  // what the server has sent before it ended the connection
+}
+
+TEST_F(HttpServerTest, StopWaitsForOperationsAndReportsThoseThatStillRun) {
+    std::promise<void> begun;
+    std::promise<void> finish;
+    manager.answerWith([&, isFinished = finish.get_future().share()](const Request&) {
+        begun.set_value();
+        isFinished.wait();
+        return Response{};
+    });
+    const Socket client = connect();
+    client.send(requestOf(reader));
+    begun.get_future().wait();
+    EXPECT_FALSE(server().drain(0s));
+    finish.set_value();
+    EXPECT_TRUE(server().drain(1h));
+}
+
+TEST_F(HttpServerTest, AServerThatStopsRefusesConnections) {
+    const std::uint16_t port = server().listeners().front().port;
+    EXPECT_TRUE(server().drain(0s));
+    Socket client(::socket(AF_INET, SOCK_STREAM, 0));
+    sockaddr_in address{};
+    address.sin_family = AF_INET;
+    address.sin_port = htons(port);
+    address.sin_addr.s_addr = htonl(INADDR_LOOPBACK);
+    EXPECT_NE(::connect(client.get(), reinterpret_cast<const sockaddr*>(&address), sizeof address), 0);
+}
+
+}  // namespace
