@@ -7,6 +7,7 @@
 
 #include <algorithm>
 #include <array>
+#include <cerrno>
 #include <charconv>
 #include <cstdint>
 #include <ctime>
@@ -63,7 +64,8 @@ RecordFile::RecordFile(const std::string& directory, const char* fileName, std::
       lines(linesPerRecord) {}
 
 std::optional<std::string> RecordFile::content() const {
-    return readFile(file);
+    auto found = readFile(file);
+    return found ? std::optional<std::string>(copies.withoutLastLine(*std::move(found))) : std::nullopt;
 }
 
 std::optional<std::size_t> RecordFile::promisedIn(std::string_view content) {
@@ -101,6 +103,9 @@ SavedCopies::Copy RecordFile::savedCopy() const {
 std::string RecordFile::prepare(const std::string& current, bool hasSteps) const {
     const std::string copy = savedCopy().content;
     const std::string records = isComplete(current) ? current : current.empty() && copy.empty() ? "0\n" : copy;
+    if (current.empty() && copy.empty()) {
+        createFile(file, 0666);
+    }
     if (!records.empty() && (records != copy || hasSteps)) {
         copies.save(records, hasSteps);
     }
@@ -135,6 +140,12 @@ std::string RecordFile::defect() const {
     return copy.isUnfinished && addsOneRecord(*current, copy.content) ? name + " held an unfinished change." : "";
 }
 
+bool RecordFile::isStored() const {
+    struct stat status {};
+    const bool hasContent = stat(file.c_str(), &status) == 0 ? status.st_size != 0 : errno != ENOENT;
+    return hasContent || !savedCopy().content.empty();
+}
+
 bool RecordFile::needsRecovery() const {
     return !savedCopy().content.empty() && !defect().empty();
 }
@@ -155,6 +166,7 @@ std::string RecordFile::restoreSaved() const {
 std::string RecordFile::recover() const {
     const std::string state = defect();
     if (state.empty()) {
+        finishEarlierWork();
         return {};
     }
     const std::string restored = restoreSaved();
@@ -170,6 +182,18 @@ std::string RecordFile::recover() const {
         replaceFile(damaged, current, file);
     }
     return state + " There is no saved copy." + (isKept ? " A copy of it is kept as " + damaged + "." : "");
+}
+
+/** A process may have ended before it synced a complete copy, or removed the last line of a restored one. */
+void RecordFile::finishEarlierWork() const {
+    const SavedCopies::Copy copy = savedCopy();
+    if (!copy.content.empty()) {
+        syncFile(copy.path);
+    }
+    const std::string found = readFile(file).value_or(std::string());
+    const std::string records = copies.withoutLastLine(found);
+    const bool isTidy = records == found || truncate(file.c_str(), static_cast<off_t>(records.size())) == 0;
+    static_cast<void>(isTidy);  // the last line does not matter
 }
 
 void RecordFile::replace(std::string_view records) const {

@@ -28,6 +28,9 @@ public:
 
     Copy latest() const { return byAge()[1]; }
 
+    /** The content without the last line of a copy, which a restored file may still have. */
+    std::string withoutLastLine(std::string content) const;
+
     /** Writes a copy to the disk. It has the mode, owner and group of the file. */
     void save(std::string_view content, bool isUnfinished) const;
 
@@ -35,6 +38,7 @@ public:
     void restoreLatest() const;
 
 private:
+    Copy parse(std::string content) const;
     Copy read(const std::string& path) const;
     std::array<Copy, 2> byAge() const;
     std::string lastLine(const Copy& copy) const;
