@@ -101,12 +101,13 @@ SavedCopies::Copy RecordFile::savedCopy() const {
 }
 
 std::string RecordFile::prepare(const std::string& current, bool hasSteps) const {
-    const std::string copy = savedCopy().content;
-    const std::string records = isComplete(current) ? current : current.empty() && copy.empty() ? "0\n" : copy;
-    if (current.empty() && copy.empty()) {
+    const SavedCopies::Copy copy = savedCopy();
+    const bool isNew = current.empty() && copy.content.empty();
+    const std::string records = isComplete(current) ? current : isNew ? "0\n" : copy.content;
+    if (isNew) {
         createFile(file, 0666);
     }
-    if (!records.empty() && (records != copy || hasSteps)) {
+    if (!records.empty() && (records != copy.content || copy.isUnfinished || hasSteps)) {
         copies.save(records, hasSteps);
     }
     return records;
@@ -129,15 +130,18 @@ void RecordFile::restore(const std::string& before) const {
 }
 
 std::string RecordFile::defect() const {
-    const auto current = content();
-    if (!current) {
+    const auto found = readFile(file);
+    if (!found) {
         return name + " was missing.";
     }
-    if (!isComplete(*current)) {
-        return name + countsOf(*current);
+    const std::string current = copies.withoutLastLine(*found);
+    if (!isComplete(current)) {
+        return name + countsOf(current);
     }
     const SavedCopies::Copy copy = savedCopy();
-    return copy.isUnfinished && addsOneRecord(*current, copy.content) ? name + " held an unfinished change." : "";
+    const bool isRestored = current.size() != found->size();
+    const bool isUnfinished = !isRestored && copy.isUnfinished && addsOneRecord(current, copy.content);
+    return isUnfinished ? name + " held an unfinished change." : "";
 }
 
 bool RecordFile::isStored() const {
@@ -166,7 +170,10 @@ std::string RecordFile::restoreSaved() const {
 std::string RecordFile::recover() const {
     const std::string state = defect();
     if (state.empty()) {
-        finishEarlierWork();
+        if (const SavedCopies::Copy copy = savedCopy(); !copy.content.empty()) {
+            syncFile(copy.path);  // it may be of a process that has ended before
+        }
+        copies.finishRestoring();
         return {};
     }
     const std::string restored = restoreSaved();
@@ -182,18 +189,6 @@ std::string RecordFile::recover() const {
         replaceFile(damaged, current, file);
     }
     return state + " There is no saved copy." + (isKept ? " A copy of it is kept as " + damaged + "." : "");
-}
-
-/** A process may have ended before it synced a complete copy, or removed the last line of a restored one. */
-void RecordFile::finishEarlierWork() const {
-    const SavedCopies::Copy copy = savedCopy();
-    if (!copy.content.empty()) {
-        syncFile(copy.path);
-    }
-    const std::string found = readFile(file).value_or(std::string());
-    const std::string records = copies.withoutLastLine(found);
-    const bool isTidy = records == found || truncate(file.c_str(), static_cast<off_t>(records.size())) == 0;
-    static_cast<void>(isTidy);  // the last line does not matter
 }
 
 void RecordFile::replace(std::string_view records) const {

@@ -97,7 +97,6 @@ private:
     bool addsOneRecord(std::string_view content, std::string_view former) const;
 
     std::string countsOf(std::string_view content) const;
-    void finishEarlierWork() const;
 
     std::string name;
     std::string file;

@@ -5,7 +5,9 @@
 #include <unistd.h>
 
 #include <algorithm>
+#include <cerrno>
 #include <charconv>
+#include <exception>
 #include <utility>
 
 namespace durable {
@@ -76,18 +78,32 @@ void SavedCopies::save(std::string_view content, bool isUnfinished) const {
     overwriteFile(older.path, std::string(content) + lastLine({{}, {}, last.number + 1, isUnfinished}), file);
 }
 
-/**
- * The directory is synced before the file is shortened and the other copy is removed: until the new name is on the
- * disk, the copies must stay.
- */
 void SavedCopies::restoreLatest() const {
-    const auto [older, last] = byAge();
+    const Copy last = latest();
+    syncFile(last.path);  // it may be of a process that has ended before
     renameFile(last.path, file);
     syncDirectoryOf(file);
-    // Neither a later line nor an old copy matters, so these need not succeed.
-    const bool isTidy =
-        truncate(file.c_str(), static_cast<off_t>(last.content.size())) == 0 && unlink(older.path.c_str()) == 0;
-    static_cast<void>(isTidy);
+    try {
+        finishRestoring();
+    } catch (const std::exception&) {
+        return;  // the last line does not matter
+    }
+}
+
+/** The last line is removed after the older copy: until then, it proves that the file is newer. */
+void SavedCopies::finishRestoring() const {
+    const std::string content = readFile(file).value_or(std::string());
+    const std::size_t size = withoutLastLine(content).size();
+    if (size == content.size()) {
+        return;
+    }
+    syncFile(file);
+    const bool isAlone = std::all_of(paths.begin(), paths.end(), [](const std::string& path) {
+        return unlink(path.c_str()) == 0 || errno == ENOENT;
+    });
+    syncDirectoryOf(file);
+    const bool isFinished = isAlone && truncate(file.c_str(), static_cast<off_t>(size)) == 0;
+    static_cast<void>(isFinished);
 }
 
 }  // namespace durable

@@ -34,8 +34,11 @@ public:
     /** Writes a copy to the disk. It has the mode, owner and group of the file. */
     void save(std::string_view content, bool isUnfinished) const;
 
-    /** Makes the latest copy the file, which needs no disk space. Removes the other one. */
+    /** Makes the latest copy the file, which needs no disk space. Removes the other one if possible. */
     void restoreLatest() const;
+
+    /** Removes the copies and then the last line of the file, if it has one: restoreLatest() was not finished. */
+    void finishRestoring() const;
 
 private:
     Copy parse(std::string content) const;

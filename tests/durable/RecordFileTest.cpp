@@ -280,6 +280,24 @@ TEST_F(RecordFileTest, AnotherCompleteFileIsKeptAlthoughAChangeIsUnfinished) {
     }
 }
 
+TEST_F(RecordFileTest, ARestoredFileIsKeptAlthoughTheOlderCopyIsOfAnUnfinishedChange) {
+    const std::string complete = records({"W1", "W2"});
+    writeFile(path, complete + "saved copy 8 of Warranty.dat\n");
+    writeFile(saved, records({"W1"}) + "saved copy 7 of Warranty.dat before an unfinished change\n");
+    for (int time = 0; time < 2; ++time) {
+        EXPECT_THAT(file.recover(), IsEmpty());
+        EXPECT_EQ(readFile(path), complete);
+    }
+}
+
+TEST_F(RecordFileTest, ReplacedRecordsAreKeptAlthoughAChangeWasNotFinished) {
+    writeFile(path, records({"W1"}));
+    prepare(true);
+    file.replace(records({"W1", "W2"}));
+    EXPECT_THAT(file.recover(), IsEmpty());
+    EXPECT_EQ(readFile(path), records({"W1", "W2"}));
+}
+
 TEST_F(RecordFileTest, ACommittedChangeIsSavedAndFinished) {
     writeFile(path, records({"W1"}));
     prepare(true);
