@@ -4,32 +4,66 @@
 #include <unistd.h>
 
 #include <algorithm>
-#include <chrono>
+#include <ctime>
 #include <system_error>
-#include <thread>
 
 namespace durable {
 
 namespace {
 
-/** Maximum time that open() waits for the owner to finish writing. */
-constexpr std::chrono::seconds writeTimeout{1};
-constexpr std::chrono::milliseconds pollInterval{20};
+constexpr long long second = 1000000000;
+
+long long nanosecondsIn(const timespec& time) {
+    return time.tv_sec * second + time.tv_nsec;
+}
+
+/** The present time of the clock that file systems use, which advances every few milliseconds. */
+long long timeOfFiles() {
+    timespec now{};
+    clock_gettime(CLOCK_REALTIME_COARSE, &now);
+    return nanosecondsIn(now);
+}
 
 }  // namespace
 
-void DataDirectory::open() {
+bool DataDirectory::open() {
     acquireLock();
-    if (isOwner) {
+    hasOtherOwner = false;
+    if (isOwner()) {
         recover();
-    } else {
-        const auto end = std::chrono::steady_clock::now() + writeTimeout;
-        while (needRecovery() && std::chrono::steady_clock::now() < end) {
-            std::this_thread::sleep_for(pollInterval);
+    }
+    const long long now = timeOfFiles();
+    openStamp = stamp();
+    remember(openStamp);
+    // A file that is written again at the time of its last change would seem unchanged. A later time is a wrong one.
+    const bool isSettled = std::none_of(openStamp.begin(), openStamp.end(),
+                                        [&](const auto& file) { return file[2] >= now && file[2] < now + second; });
+    return isOwner() || (isSettled && !needRecovery());
+}
+
+void DataDirectory::close() {
+    lock.release();
+    wereStored = {};
+}
+
+bool DataDirectory::hasLostFiles() const {
+    const std::vector<RecordFile> files = recordFilesIn(path());
+    for (std::size_t index = 0; index < files.size(); ++index) {
+        try {
+            if (wereStored[index] && !files[index].isStored()) {
+                return true;
+            }
+        } catch (const std::system_error&) {
+            continue;  // there is a copy, which cannot be read
         }
     }
-    hasOtherOwner = false;
-    openStamp = stamp();
+    return false;
+}
+
+void DataDirectory::remember(const Stamp& stamp) {
+    for (std::size_t index = 0; index < stamp.size(); ++index) {
+        wereStored[index] = wereStored[index] || stamp[index][1] != 0;
+    }
 }
 
 bool DataDirectory::exists() const {
@@ -41,9 +75,11 @@ DataDirectory::Ownership DataDirectory::acquire() {
     hasOtherOwner = true;  // if an exception leaves the question open
     const DirectoryLock::Result result = acquireLock();
     const bool isOther = result.state == DirectoryLock::State::heldByOther;
+    const Stamp now = stamp();
     // Without record files, the provider's records are the only ones.
-    hasOtherOwner = hadOtherOwner || (result.state == DirectoryLock::State::acquired && stamp() != Stamp{});
-    return {isOwner, isOther,
+    hasOtherOwner = hadOtherOwner || (result.state == DirectoryLock::State::acquired && now != Stamp{});
+    remember(now);
+    return {isOwner(), isOther,
             "The data directory " + path() +
                 (isOther ? " is in use by " + result.reason + ". Send the request to that process, or end it."
                          : " cannot be changed by this process. " + result.reason + ".")};
@@ -56,7 +92,9 @@ DirectoryLock::Result DataDirectory::acquireLock() {
         isReported = true;
         log("The data directory cannot be locked, so do not let two processes change it. " + result.reason);
     }
-    isOwner = result.state != DirectoryLock::State::heldByOther && result.state != DirectoryLock::State::denied;
+    const bool isDenied =
+        result.state == DirectoryLock::State::heldByOther || result.state == DirectoryLock::State::denied;
+    owner = isDenied ? 0 : getpid();
     return result;
 }
 
@@ -94,8 +132,7 @@ DataDirectory::Stamp DataDirectory::stamp() const {
     for (std::size_t index = 0; index < stamp.size(); ++index) {
         struct stat status {};
         stat(files[index].path().c_str(), &status);
-        stamp[index] = {static_cast<long long>(status.st_ino), status.st_size, status.st_mtim.tv_sec,
-                        status.st_mtim.tv_nsec};
+        stamp[index] = {static_cast<long long>(status.st_ino), status.st_size, nanosecondsIn(status.st_mtim)};
     }
     return stamp;
 }

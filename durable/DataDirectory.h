@@ -3,6 +3,9 @@
 #include "DirectoryLock.h"
 #include "RecordFile.h"
 
+#include <sys/types.h>
+#include <unistd.h>
+
 #include <array>
 #include <string>
 
@@ -22,17 +25,17 @@ public:
         : path(itsPath), log(itsLog) {}
 
     /**
-     * Called before the provider is loaded. Acquires the lock if possible. The owner recovers the record files; another
-     * process waits at most a second until they need no recovery. Throws std::system_error if a file cannot be checked
-     * or restored.
+     * Called before the provider is loaded. Acquires the lock if possible. The owner recovers the record files. Throws
+     * std::system_error if a file cannot be checked or restored.
+     * @return whether the files may be read now; false if they are incomplete, or another process may be writing them
      */
-    void open();
+    bool open();
 
-    /** Whether the directory exists. */
-    bool exists() const;
+    /** Whether a record file that was there is gone with its copies: then its records are only in memory. */
+    bool hasLostFiles() const;
 
-    /** Releases the lock. Called when the provider is unloaded. */
-    void close() { lock.release(); }
+    /** Releases the lock. Called when the provider is unloaded for the last time. */
+    void close();
 
     /** The result of acquire(). */
     struct Ownership {
@@ -44,28 +47,32 @@ public:
     /** Tries to become the owner, for a change. Returns at once. */
     Ownership acquire();
 
-    /** Whether another process has written the files since open(). It may not have finished. */
-    bool hasChanged() const { return !isOwner && stamp() != openStamp; }
+    /** Whether another process has written the files since open() returned true. It may not have finished. */
+    bool hasChanged() const { return !isOwner() && stamp() != openStamp; }
 
     /** Whether the provider has to be loaded again, because another process has changed the files or may have. */
     bool isOutdated() const { return hasOtherOwner || (hasChanged() && !needRecovery()); }
 
 private:
     /** The inodes, sizes and times of the record files. */
-    using Stamp = std::array<std::array<long long, 4>, recordFileCount>;
+    using Stamp = std::array<std::array<long long, 3>, recordFileCount>;
 
+    bool isOwner() const { return owner == getpid(); }
+    bool exists() const;
     DirectoryLock::Result acquireLock();
     void recover() const;
     bool needRecovery() const;
     Stamp stamp() const;
+    void remember(const Stamp& stamp);
 
     std::string (*path)();
     void (*log)(const std::string&);
     DirectoryLock lock{};
-    bool isOwner = false;
+    pid_t owner = 0;  ///< this process, if it is the owner; a forked child is not
     bool isReported = false;
     bool hasOtherOwner = false;  ///< whether another process may have been the owner since open()
     Stamp openStamp{};
+    std::array<bool, recordFileCount> wereStored{};
 };
 
 }  // namespace durable

@@ -22,10 +22,35 @@ struct flock lockOfFile() {
     return lock;
 }
 
-/** Lets all users lock the file who may write to the directory. Another user's file keeps its mode. */
+/** Tries to lock the file. Returns 0 or the error. */
+int tryLock(int descriptor) {
+    struct flock lock = lockOfFile();
+    int error = 0;
+    do {
+        error = fcntl(descriptor, F_SETLK, &lock) == 0 ? 0 : errno;
+    } while (error == EINTR);
+    return error;
+}
+
+/** The result of a failed try. Errors of file systems without locks are those of an unknown operation. */
+DirectoryLock::State stateAfter(int error) {
+    if (error == EACCES || error == EAGAIN) {
+        return DirectoryLock::State::heldByOther;
+    }
+    const bool isUnknown = error == EINVAL || error == ENOSYS || error == EOPNOTSUPP;
+    return isUnknown ? DirectoryLock::State::unavailable : DirectoryLock::State::denied;
+}
+
+/**
+ * Lets all users lock the file who may write to the directory, also if this process is of root. Another user's file
+ * keeps its mode, and a file that has another name too, its owner.
+ */
 void shareWithUsersOf(const std::string& directory, int descriptor) {
     struct stat found {};
-    const bool isShared = stat(directory.c_str(), &found) == 0 && fchmod(descriptor, found.st_mode & 0666U) == 0;
+    struct stat file {};
+    const bool isShared = stat(directory.c_str(), &found) == 0 && fstat(descriptor, &file) == 0 &&
+                          fchmod(descriptor, found.st_mode & 0666U) == 0 && file.st_nlink == 1 &&
+                          fchown(descriptor, found.st_uid, found.st_gid) == 0;
     static_cast<void>(isShared);
 }
 
@@ -39,22 +64,19 @@ DirectoryLock::Result DirectoryLock::acquire(const std::string& directory) {
     release();  // inherited from the parent process, or removed from the directory
     descriptor = open(path.c_str(), O_RDWR | O_CREAT | O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK, 0644);
     const bool isOpen = descriptor >= 0;
-    struct flock lock = lockOfFile();
-    if (isOpen && fcntl(descriptor, F_SETLK, &lock) == 0) {
+    const int error = isOpen ? tryLock(descriptor) : errno;
+    if (error == 0) {
         process = getpid();
         shareWithUsersOf(directory, descriptor);
         writeOwner();
         return {State::acquired};
     }
-    const int error = errno;
     if (!isOpen && (error == EMFILE || error == ENFILE || error == ENOMEM || error == EIO)) {
         throw std::system_error(error, std::generic_category(), path);
     }
-    const bool isOther = isOpen && (error == EACCES || error == EAGAIN);
-    Result result{isOther                     ? State::heldByOther
-                  : isOpen || error == ENOENT ? State::unavailable
-                                              : State::denied,
-                  isOther ? ownerOf(path) : path + ": " + std::generic_category().message(error)};
+    const State state = isOpen ? stateAfter(error) : error == ENOENT ? State::unavailable : State::denied;
+    Result result{state,
+                  state == State::heldByOther ? ownerOf(path) : path + ": " + std::generic_category().message(error)};
     release();
     return result;
 }

@@ -24,6 +24,11 @@ void require(bool isDone, const std::string& path) {
     }
 }
 
+/** The directory of a file, with a separator at its end. */
+std::string directoryOf(const std::string& path) {
+    return path.substr(0, path.rfind('/') + 1);
+}
+
 /** A file that is open during the lifetime of this object. */
 class Descriptor {
 public:
@@ -69,18 +74,34 @@ public:
         }
     }
 
+    /** Copies owner and group of the directory as far as permitted, so that its owner can use a file of root. */
+    void belongToDirectory() const {
+        struct stat found {};
+        const bool isOwned =
+            stat(directoryOf(path).c_str(), &found) == 0 && fchown(number, found.st_uid, found.st_gid) == 0;
+        static_cast<void>(isOwned);
+    }
+
     /**
      * Copies owner, group and mode as far as permitted. If the group cannot be copied, only the new owner has access. A
-     * file of another user keeps its mode.
+     * file of another user keeps its mode. Without a model, copies owner and group of the directory.
      */
     void beLike(const std::string& model) const {
         struct stat found {};
-        if (stat(model.c_str(), &found) == 0) {
+        if (stat(model.c_str(), &found) != 0) {
+            belongToDirectory();
+        } else {
             const bool hasGroup = fchown(number, static_cast<uid_t>(-1), found.st_gid) == 0;
             const bool hasOwner = fchown(number, found.st_uid, static_cast<gid_t>(-1)) == 0;
             const bool hasMode = fchmod(number, found.st_mode & (hasGroup ? 0777U : 0700U)) == 0;
             require(hasMode || (errno == EPERM && !hasOwner), path);
         }
+    }
+
+    /** Removes the content if that is possible. */
+    void clear() const {
+        const bool isEmpty = ftruncate(number, 0) == 0;
+        static_cast<void>(isEmpty);
     }
 
     void sync() const {
@@ -98,9 +119,14 @@ private:
 void writeFile(const std::string& path, int flags, std::string_view content, const std::string& model) {
     const Descriptor file(path, O_WRONLY | O_CREAT | O_TRUNC | O_NOFOLLOW | O_NONBLOCK | flags, 0600);
     require(file.isOpen(), path);
-    file.beLike(model);
-    file.writeAll(content);
-    file.sync();
+    try {
+        file.beLike(model);
+        file.writeAll(content);
+        file.sync();
+    } catch (...) {
+        file.clear();  // it may be complete, but not on the disk
+        throw;
+    }
 }
 
 }  // namespace
@@ -127,9 +153,13 @@ void overwriteFile(const std::string& path, std::string_view content, const std:
     writeFile(path, 0, content, model);
 }
 
-void createFile(const std::string& path) {
-    const Descriptor file(path, O_WRONLY | O_CREAT | O_NOFOLLOW | O_NONBLOCK, 0600);
-    require(file.isOpen(), path);
+void createFile(const std::string& path, mode_t mode) {
+    const Descriptor file(path, O_WRONLY | O_CREAT | O_EXCL, mode);
+    if (file.isOpen()) {
+        file.belongToDirectory();
+    } else {
+        require(errno == EEXIST, path);
+    }
 }
 
 void renameFile(const std::string& from, const std::string& to) {
@@ -148,7 +178,7 @@ void syncFile(const std::string& path) {
 }
 
 void syncDirectoryOf(const std::string& path) {
-    syncFile(path.substr(0, path.rfind('/') + 1));
+    syncFile(directoryOf(path));
 }
 
 }  // namespace durable

@@ -1,5 +1,7 @@
 #pragma once
 
+#include <sys/types.h>
+
 #include <optional>
 #include <string>
 #include <string_view>
@@ -15,19 +17,24 @@ std::optional<std::string> readFile(const std::string& path);
 /**
  * Replaces or creates a file. At any time, it has the old or the new content. The new content is on the disk when the
  * function returns, and has the file's name after syncDirectoryOf().
- * @param model the file whose mode, owner and group the new one gets, if it exists; otherwise only the owner has access
+ * @param model the file whose mode, owner and group the new one gets; if it does not exist, the new one gets owner and
+ *     group of the directory, and only the owner has access
  */
 void replaceFile(const std::string& path, std::string_view content, const std::string& model);
 
 /**
  * Writes a file in place, without following a link. The new content is on the disk when the function returns; meanwhile
- * the file is incomplete.
+ * the file is incomplete, and if the function fails, it is empty or incomplete.
  * @param model as for replaceFile()
  */
 void overwriteFile(const std::string& path, std::string_view content, const std::string& model);
 
-/** Creates an empty file, unless it exists. Its name is on the disk after syncDirectoryOf(). */
-void createFile(const std::string& path);
+/**
+ * Creates an empty file, unless it exists. It gets owner and group of the directory. Its name is on the disk after
+ * syncDirectoryOf().
+ * @param mode less the umask
+ */
+void createFile(const std::string& path, mode_t mode);
 
 /** Renames a file. The new name is on the disk after syncDirectoryOf(). */
 void renameFile(const std::string& from, const std::string& to);

@@ -7,6 +7,7 @@
 
 #include <algorithm>
 #include <array>
+#include <cerrno>
 #include <charconv>
 #include <cstdint>
 #include <ctime>
@@ -63,7 +64,8 @@ RecordFile::RecordFile(const std::string& directory, const char* fileName, std::
       lines(linesPerRecord) {}
 
 std::optional<std::string> RecordFile::content() const {
-    return readFile(file);
+    auto found = readFile(file);
+    return found ? std::optional<std::string>(copies.withoutLastLine(*std::move(found))) : std::nullopt;
 }
 
 std::optional<std::size_t> RecordFile::promisedIn(std::string_view content) {
@@ -99,9 +101,13 @@ SavedCopies::Copy RecordFile::savedCopy() const {
 }
 
 std::string RecordFile::prepare(const std::string& current, bool hasSteps) const {
-    const std::string copy = savedCopy().content;
-    const std::string records = isComplete(current) ? current : current.empty() && copy.empty() ? "0\n" : copy;
-    if (!records.empty() && (records != copy || hasSteps)) {
+    const SavedCopies::Copy copy = savedCopy();
+    const bool isNew = current.empty() && copy.content.empty();
+    const std::string records = isComplete(current) ? current : isNew ? "0\n" : copy.content;
+    if (isNew) {
+        createFile(file, 0666);
+    }
+    if (!records.empty() && (records != copy.content || copy.isUnfinished || hasSteps)) {
         copies.save(records, hasSteps);
     }
     return records;
@@ -124,15 +130,24 @@ void RecordFile::restore(const std::string& before) const {
 }
 
 std::string RecordFile::defect() const {
-    const auto current = content();
-    if (!current) {
+    const auto found = readFile(file);
+    if (!found) {
         return name + " was missing.";
     }
-    if (!isComplete(*current)) {
-        return name + countsOf(*current);
+    const std::string current = copies.withoutLastLine(*found);
+    if (!isComplete(current)) {
+        return name + countsOf(current);
     }
     const SavedCopies::Copy copy = savedCopy();
-    return copy.isUnfinished && addsOneRecord(*current, copy.content) ? name + " held an unfinished change." : "";
+    const bool isRestored = current.size() != found->size();
+    const bool isUnfinished = !isRestored && copy.isUnfinished && addsOneRecord(current, copy.content);
+    return isUnfinished ? name + " held an unfinished change." : "";
+}
+
+bool RecordFile::isStored() const {
+    struct stat status {};
+    const bool hasContent = stat(file.c_str(), &status) == 0 ? status.st_size != 0 : errno != ENOENT;
+    return hasContent || !savedCopy().content.empty();
 }
 
 bool RecordFile::needsRecovery() const {
@@ -155,6 +170,10 @@ std::string RecordFile::restoreSaved() const {
 std::string RecordFile::recover() const {
     const std::string state = defect();
     if (state.empty()) {
+        if (const SavedCopies::Copy copy = savedCopy(); !copy.content.empty()) {
+            syncFile(copy.path);  // it may be of a process that has ended before
+        }
+        copies.finishRestoring();
         return {};
     }
     const std::string restored = restoreSaved();

@@ -30,7 +30,7 @@ public:
     /** The path; if NAME is a symbolic link, of its target. */
     const std::string& path() const { return file; }
 
-    /** The content; none if there is no file. */
+    /** The content, without the last line of a copy that was restored; none if there is no file. */
     std::optional<std::string> content() const;
 
     /** The number of records that the first line promises; none if it is not an unsigned 32-bit number. */
@@ -44,7 +44,7 @@ public:
 
     /**
      * Ensures that the latest copy has the current records: those of the file or, if that is incomplete, of the
-     * existing copy. A missing or empty file without a copy has none.
+     * existing copy. A missing or empty file without a copy has none, and is created.
      * @param current the content of the file; empty if there is none
      * @param hasSteps whether the change writes the file more than once; recover() discards its intermediate states
      * @return what restore() needs; empty for an incomplete file without a copy
@@ -63,6 +63,9 @@ public:
     /** A sentence about a file that is missing, incomplete or has an intermediate state; empty for another one. */
     std::string defect() const;
 
+    /** Whether the file or a copy has content. Otherwise the provider's records, if any, are only in memory. */
+    bool isStored() const;
+
     /** Whether the file has a defect, and there is a copy. */
     bool needsRecovery() const;
 
@@ -77,7 +80,8 @@ public:
 
     /**
      * Restores a file that needsRecovery() from the saved copy. Without a saved copy, keeps a copy of an incomplete
-     * file that is not empty. Call it before the provider is loaded and reads its files.
+     * file that is not empty. Ends a restoration and the writing of a copy that an earlier process has not ended. Call
+     * it before the provider is loaded and reads its files.
      * @return a message for the log; empty if the file was complete
      */
     std::string recover() const;

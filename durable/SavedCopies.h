@@ -28,13 +28,20 @@ public:
 
     Copy latest() const { return byAge()[1]; }
 
+    /** The content without the last line of a copy, which a restored file may still have. */
+    std::string withoutLastLine(std::string content) const;
+
     /** Writes a copy to the disk. It has the mode, owner and group of the file. */
     void save(std::string_view content, bool isUnfinished) const;
 
-    /** Makes the latest copy the file, which needs no disk space. Removes the other one. */
+    /** Makes the latest copy the file, which needs no disk space. Removes the other one if possible. */
     void restoreLatest() const;
 
+    /** Removes the copies and then the last line of the file, if it has one: restoreLatest() was not finished. */
+    void finishRestoring() const;
+
 private:
+    Copy parse(std::string content) const;
     Copy read(const std::string& path) const;
     std::array<Copy, 2> byAge() const;
     std::string lastLine(const Copy& copy) const;

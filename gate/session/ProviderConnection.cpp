@@ -21,7 +21,7 @@ namespace {
  */
 constexpr std::chrono::seconds drainTimeout{5};
 
-/** How long a request waits for another owner of the data directory, and for up-calls of the provider. */
+/** How long a request waits for another process that uses the data directory, and for up-calls of the provider. */
 constexpr std::chrono::seconds waitTimeout{5};
 constexpr std::chrono::milliseconds pollInterval{10};
 
@@ -93,7 +93,11 @@ void ProviderConnection::connect(const CMPIBroker* manager) {
     wrapped.emplace(manager,
                     WrappedBroker::Lock{[] { theConnection.beginUpCall(); }, [] { theConnection.endUpCall(); }});
     try {
-        library.isLoaded() ? createInterfaces() : load();
+        if (library.isLoaded()) {
+            createInterfaces();
+        } else {
+            load();  // if the files are being written, again at the first request
+        }
     } catch (...) {
         set(nullptr);
         throw;
@@ -117,33 +121,36 @@ bool ProviderConnection::needsLoading() const {
 }
 
 void ProviderConnection::requireCurrent(LockGuard& guard) {
-    waitWhile(guard, [&] { return needsLoading() && upCalls != 0; });
-    if (needsLoading()) {
-        if (upCalls != 0) {
-            fail(CMPI_RC_ERR_FAILED,
-                 "The provider waits for the object manager and cannot be loaded again. Try again.");
-        }
-        const bool hasLoaded = isOutdated || library.isLoaded();
-        if (hasLoaded && !theDirectory.exists()) {  // it would have no records
-            fail(CMPI_RC_ERR_FAILED, "The data directory does not exist. Restore it and try again.");
-        }
-        load();
+    bool isWaiting = false;
+    waitWhile(guard, [&] { return isWaiting = needsLoading() && (upCalls != 0 || !load()); });
+    if (isWaiting) {
+        fail(CMPI_RC_ERR_FAILED,
+             upCalls != 0 ? "The provider waits for the object manager and cannot be loaded again. Try again."
+                          : "The record files are incomplete, or another process is writing them. Try again.");
     }
 }
 
-/** Loads the provider, which reads its files. Unloads it first if it is loaded. */
-void ProviderConnection::load() {
-    constexpr int attempts = 10;
-    isOutdated = true;
-    for (int attempt = 0; attempt == 0 || (theDirectory.hasChanged() && attempt < attempts); ++attempt) {
-        unload();
-        theDirectory.open();
-        library.load();
+/**
+ * Loads the provider, which reads its files. Unloads it first if it is loaded. Returns whether the files were complete
+ * and did not change meanwhile.
+ */
+bool ProviderConnection::load() {
+    if (theDirectory.hasLostFiles()) {
+        fail(CMPI_RC_ERR_FAILED, "The record files were removed. Restore the data directory and try again.");
     }
+    isOutdated = true;
+    unload();
+    if (!theDirectory.open()) {
+        return false;
+    }
+    library.load();
     shutdownAtExit.registerAgain();
-    createInterfaces();
-    isOutdated = false;
-    verified = 0;
+    if (!theDirectory.hasChanged()) {
+        createInterfaces();
+        isOutdated = false;
+        verified = 0;
+    }
+    return !isOutdated;
 }
 
 void ProviderConnection::unload() {

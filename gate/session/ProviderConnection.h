@@ -52,7 +52,8 @@ public:
 
     /**
      * Loads the provider if it is not loaded or outdated. Releases the lock until no other request is in an up-call of
-     * the provider, since it cannot be unloaded before. Fails with CMPI_RC_ERR_FAILED if that takes too long.
+     * the provider, since it cannot be unloaded before, and until no other process writes the files. Fails with
+     * CMPI_RC_ERR_FAILED if that takes too long, or if a file was removed, whose records would be lost.
      */
     void requireCurrent(LockGuard& guard);
 
@@ -65,7 +66,7 @@ private:
     static std::size_t bitOf(const Class& owner) { return std::size_t{1} << (&owner - Classes().begin()); }
 
     bool needsLoading() const;
-    void load();
+    bool load();
     void unload();
     void createInterfaces();
     void beginUpCall();

@@ -108,7 +108,8 @@ FileState DataFile::state() const {
     struct stat status {};
     stat(path.c_str(), &status);
     return onFiles([&] {
-        return FileState{durable::readFile(path).value_or(std::string()),
+        const auto content = hasRecords ? recordFileOf(*this).content() : durable::readFile(path);
+        return FileState{content.value_or(std::string()),
                          status.st_mtim.tv_sec * 1000000000LL + status.st_mtim.tv_nsec};
     });
 }
@@ -119,6 +120,10 @@ bool DataFile::hasCount(std::size_t count) const {
         const auto promised = durable::RecordFile::promisedIn(file.content().value_or(std::string()));
         return !file.needsRecovery() && promised.value_or(0) == count;
     });
+}
+
+bool DataFile::isStored() const {
+    return onFiles([&] { return recordFileOf(*this).isStored(); });
 }
 
 FileState DataFile::begin(bool hasSteps) const {

@@ -37,6 +37,9 @@ struct DataFile {
 
     FileState state() const;
 
+    /** Whether the record file or a copy has content. */
+    bool isStored() const;
+
     /** Whether the record file needs no recovery and has this number of records. */
     bool hasCount(std::size_t count) const;
 

@@ -110,15 +110,29 @@ void Transaction::apply(const CMPIInstance* current, const Values& changes) cons
  * report that it could not read the file.
  */
 void Transaction::requireTable() const {
-    if (!file.hasRecords || theConnection.isVerified(owner)) {
+    if (!file.hasRecords || (theConnection.isVerified(owner) && file.isStored())) {
         return;
     }
-    if (!file.hasCount(session.names(LocalObjectPath(nameSpaceOf(path.handle()), owner)).size())) {
+    const ProviderSession::Paths paths = session.names(LocalObjectPath(nameSpaceOf(path.handle()), owner));
+    if (!paths.empty() && !file.isStored()) {
+        storeTable(paths.front());
+    }
+    if (!file.hasCount(paths.size())) {
         session.setOutdated();
         fail(CMPI_RC_ERR_FAILED, std::string(file.fileName) +
                                      " has other records than the provider. It is read again; repeat the request.");
     }
     theConnection.setVerified(owner);
+}
+
+/** Stores records that are only in memory, since their file was removed, by setting a value to itself. */
+void Transaction::storeTable(const CMPIObjectPath* record) const {
+    const LocalObjectPath changed = localPath(record, owner);
+    const auto* number = std::find_if(owner.begin(), owner.end(), [](const Property& property) {
+        return property.isWritable && property.type == CMPI_uint32;
+    });
+    session.modify(changed, {{number, propertyOf(session.get(changed, owner), *number).value()}});
+    file.commit({}, true);
 }
 
 /** Refuses other read-only values than an existing record has, since all records have the same. */

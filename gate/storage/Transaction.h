@@ -42,6 +42,7 @@ private:
 
     void apply(const CMPIInstance* current, const Values& changes) const;
     void requireTable() const;
+    void storeTable(const CMPIObjectPath* record) const;
     void requireReadOnlyValues(const Values& given) const;
 
     ProviderSession& session;

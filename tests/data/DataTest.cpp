@@ -261,6 +261,13 @@ TEST_F(DataTest, DamagedFilesAreReportedAndNotExported) {
     }
 }
 
+TEST_F(DataTest, TheLastLineOfARestoredCopyIsNotARecord) {
+    const std::string before = exported().dump();
+    writeFile(leases(), content + "saved copy 7 of Lease.dat\n");
+    EXPECT_THAT(run("check"), hasEnded(0, "Lease.dat is complete (records: 2).\n"));
+    EXPECT_EQ(exported().dump(), before);
+}
+
 TEST_F(DataTest, AMissingFileWithASavedCopyAndAnUnfinishedChangeAreReported) {
     // The file has one record more than the copy.
     std::size_t end = 0;

@@ -9,7 +9,9 @@
 #include <csignal>
 #include <filesystem>
 #include <functional>
+#include <system_error>
 
+#include "LockErrors.h"
 #include "support/Files.h"
 
 namespace durable {
@@ -137,6 +139,39 @@ TEST_F(DirectoryLockTest, IsOpenToUsersWhoMayWriteToTheDirectory) {
     held.acquire(path);
     held.release();
     EXPECT_EQ(stateOfAnotherUser(), State::acquired);
+}
+
+TEST_F(DirectoryLockTest, OfRootIsOpenToTheOwnerOfTheDirectory) {
+    constexpr uid_t unprivileged = 65534;
+    ASSERT_EQ(chown(path.c_str(), geteuid() == 0 ? unprivileged : geteuid(), static_cast<gid_t>(-1)), 0);
+    held.acquire(path);
+    held.release();
+    EXPECT_EQ(stateOfAnotherUser(), State::acquired);
+}
+
+TEST_F(DirectoryLockTest, IsUnavailableIfTheFileSystemHasNoLocks) {
+    for (const int error : {EINVAL, ENOSYS, EOPNOTSUPP}) {
+        const LockErrors errors{error, 1};
+        const DirectoryLock::Result result = held.acquire(path);
+        EXPECT_EQ(result.state, State::unavailable) << error;
+        EXPECT_EQ(result.reason, path + "owner: " + std::generic_category().message(error));
+    }
+}
+
+TEST_F(DirectoryLockTest, IsDeniedIfTheSystemFails) {
+    for (const int error : {ENOLCK, EIO}) {
+        const LockErrors errors{error, 1};
+        const DirectoryLock::Result result = held.acquire(path);
+        EXPECT_EQ(result.state, State::denied) << error;
+        EXPECT_EQ(result.reason, path + "owner: " + std::generic_category().message(error));
+    }
+    EXPECT_EQ(held.acquire(path).state, State::acquired);
+}
+
+TEST_F(DirectoryLockTest, IsTriedAgainAfterAnInterruption) {
+    const LockErrors errors{EINTR, 2};
+    EXPECT_EQ(held.acquire(path).state, State::acquired);
+    EXPECT_EQ(LockErrors::count, 0);
 }
 
 TEST_F(DirectoryLockTest, ReportsWhyItIsUnavailable) {

@@ -230,6 +230,17 @@ TEST_F(RecordFileTest, AnEmptyFileWithoutSavedCopyHasNoRecords) {
     EXPECT_EQ(prepare(), "0\n");
 }
 
+TEST_F(RecordFileTest, IsStoredIfTheFileOrACopyHasContent) {
+    EXPECT_FALSE(file.isStored());
+    writeFile(path, "");
+    EXPECT_FALSE(file.isStored());
+    writeFile(path, records({"W1"}));
+    EXPECT_TRUE(file.isStored());
+    prepare();
+    fs::remove(path);
+    EXPECT_TRUE(file.isStored());
+}
+
 TEST_F(RecordFileTest, TheTargetOfASymbolicLinkIsProtected) {
     const testsupport::TempDirectory other;
     const fs::path target = other.path() / "records";
@@ -269,6 +280,24 @@ TEST_F(RecordFileTest, AnotherCompleteFileIsKeptAlthoughAChangeIsUnfinished) {
     }
 }
 
+TEST_F(RecordFileTest, ARestoredFileIsKeptAlthoughTheOlderCopyIsOfAnUnfinishedChange) {
+    const std::string complete = records({"W1", "W2"});
+    writeFile(path, complete + "saved copy 8 of Warranty.dat\n");
+    writeFile(saved, records({"W1"}) + "saved copy 7 of Warranty.dat before an unfinished change\n");
+    for (int time = 0; time < 2; ++time) {
+        EXPECT_THAT(file.recover(), IsEmpty());
+        EXPECT_EQ(readFile(path), complete);
+    }
+}
+
+TEST_F(RecordFileTest, ReplacedRecordsAreKeptAlthoughAChangeWasNotFinished) {
+    writeFile(path, records({"W1"}));
+    prepare(true);
+    file.replace(records({"W1", "W2"}));
+    EXPECT_THAT(file.recover(), IsEmpty());
+    EXPECT_EQ(readFile(path), records({"W1", "W2"}));
+}
+
 TEST_F(RecordFileTest, ACommittedChangeIsSavedAndFinished) {
     writeFile(path, records({"W1"}));
     prepare(true);
@@ -292,6 +321,29 @@ TEST_F(RecordFileTest, AChangeIsRolledBackWhateverTheSavedCopyIs) {
         EXPECT_EQ(readFile(path), before);
         EXPECT_THAT(file.recover(), IsEmpty());
         EXPECT_FALSE(fs::exists(saved) || fs::exists(second)) << "one became the file, the other one is old";
+    }
+}
+
+TEST_F(RecordFileTest, TheLastLineOfARestoredCopyDoesNotCountAndIsRemoved) {
+    writeFile(path, records({"W1"}) + "saved copy 7 of Warranty.dat\n");
+    EXPECT_EQ(file.content(), records({"W1"}));
+    prepare();
+    EXPECT_EQ(file.savedCopy().content, records({"W1"}));
+    EXPECT_THAT(file.recover(), IsEmpty());
+    EXPECT_EQ(readFile(path), records({"W1"}));
+}
+
+TEST_F(RecordFileTest, FilesThatRootCreatesBelongToTheOwnerOfTheDirectory) {
+    constexpr uid_t unprivileged = 65534;
+    const uid_t owner = geteuid() == 0 ? unprivileged : geteuid();
+    ASSERT_EQ(chown(directory.path().c_str(), owner, static_cast<gid_t>(-1)), 0);
+    prepare();
+    file.commit(records({}));
+    file.replace(records({"W1"}));
+    for (const fs::path& each : {path, saved, second}) {
+        struct stat status {};
+        EXPECT_EQ(stat(each.c_str(), &status), 0) << each;
+        EXPECT_EQ(status.st_uid, owner) << each;
     }
 }
 

@@ -2,30 +2,51 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <filesystem>
 
 #include "Killing.h"
 #include "TestEnvironment.h"
+#include "durable/RecordFile.h"
 #include "operations/LoadedLibrary.h"
 
-// The gate is loaded over an incomplete record file while file operations fail: whatever it then answers, no record is
-// lost.
+// The gate reads an incomplete record file, when it is loaded or becomes the owner of the data directory, while file
+// operations or allocations fail: whatever it then answers, no record is lost. So does an import.
 
 namespace faults {
 namespace {
 
 constexpr int preparedRecords = 4;
+constexpr FaultSelection someOnce{false, 200};  ///< selects allocations
+
+/** Without malloc: the C library cannot load libraries correctly after it has run out of memory. */
+const std::vector<Failure> allocationFailures{{operationAllocate, 0}};
 
 class GateLoadFaultTest : public testing::Test {
 protected:
     GateLoadFaultTest() : environment(TestEnvironment::Library::gate) {}
 
     /** A lease file that a killed process has left, with its saved copy. */
-    void restart() {
-        FileContents files = environment.filesAtFirst();
+    static FileContents damagedFiles() {
         const std::string complete = leaseRecords(preparedRecords);
-        files[leaseFile] = complete.substr(0, complete.size() / 2);
-        files[std::string(leaseFile) + ".saved1"] = complete + "saved copy 1 of Lease.dat\n";
+        return {{leaseFile, complete.substr(0, complete.size() / 2)},
+                {std::string(leaseFile) + ".saved1", complete + "saved copy 1 of Lease.dat\n"}};
+    }
+
+    void restart() {
+        FileContents files = damagedFiles();
+        files.merge(FileContents(environment.filesAtFirst()));
         environment.restart(files);
+    }
+
+    /** Makes a change after another process was the owner and was killed. */
+    Response changeAfterOtherOwner(const Fault* fault) {
+        environment.restart();
+        leases();  // loads the provider
+        std::filesystem::remove(environment.dataDirectory() / "owner");
+        for (const auto& [name, content] : damagedFiles()) {
+            testsupport::writeFile(environment.dataDirectory() / name, content);
+        }
+        return environment.ask(otherChangeOf(leaseFile), fault);
     }
 
     /** Loads the gate and connects it. Returns the operations that it needs. */
@@ -50,6 +71,16 @@ protected:
         return lines;
     }
 
+    /** Expects the leases after the change if it was answered OK or its message admits that, otherwise those before. */
+    void expectStored(const Response& response, const Lines& after, const Lines& before) {
+        EXPECT_FALSE(response.outcome.threw);
+        environment.unload();
+        const Lines stored = leases();
+        const bool isAdmitted = response.outcome.message.find("could not be rolled back") != std::string::npos;
+        EXPECT_TRUE(stored == (response.outcome.rc == CMPI_RC_OK ? after : before) || (isAdmitted && stored == after))
+            << response.outcome.message;
+    }
+
     TestEnvironment environment;
 };
 
@@ -60,13 +91,54 @@ TEST_F(GateLoadFaultTest, NoRecordIsLostWhateverFailsWhileItIsLoaded) {
     environment.ask(otherChangeOf(leaseFile));
     const Lines changed = leases();
     EXPECT_NE(changed, complete);
-    eachFault(counts, fileFailures(), [&](const Fault& fault) {
+    const auto failOne = [&](const Fault& fault) {
         restart();
         load(&fault);
-        const Response response = environment.ask(otherChangeOf(leaseFile));
-        environment.unload();
-        EXPECT_EQ(leases(), response.outcome.rc == CMPI_RC_OK ? changed : complete) << response.outcome.message;
-    });
+        expectStored(environment.ask(otherChangeOf(leaseFile)), changed, complete);
+    };
+    eachFault(counts, fileFailures(), failOne);
+    eachFault(counts, allocationFailures, failOne, someOnce);
+}
+
+TEST_F(GateLoadFaultTest, NoRecordIsLostWhateverFailsWhileItBecomesTheOwner) {
+    const Counts counts = changeAfterOtherOwner(nullptr).counts;
+    const Lines changed = leases();
+    restart();
+    const Lines complete = leases();
+    EXPECT_NE(changed, complete);
+    const auto failOne = [&](const Fault& fault) { expectStored(changeAfterOtherOwner(&fault), changed, complete); };
+    eachFault(counts, fileFailures(), failOne, FaultSelection{false});  // waits for a lasting one to end
+    eachFault(counts, allocationFailures, failOne, someOnce);
+}
+
+TEST_F(GateLoadFaultTest, AnImportLeavesTheReplacedOrTheNewRecordsWhateverFails) {
+    const std::string imported = leaseRecords(1);
+    const durable::RecordFile file = durable::recordFileIn(environment.dataDirectory().string() + "/", leaseFile);
+    Counts counts;
+    const auto import = [&](const Fault* fault) {
+        restart();
+        const FaultInjection injection = fault == nullptr ? FaultInjection() : FaultInjection(*fault);
+        bool isDone = false;
+        try {
+            file.recover();
+            file.replace(imported);
+            isDone = true;
+        } catch (const std::exception&) {
+            isDone = false;
+        }
+        counts = injection.counts();
+        return isDone;
+    };
+    const auto failOne = [&](const Fault& fault) {
+        const bool isDone = import(&fault);
+        file.recover();
+        const std::string left = file.content().value_or(std::string());
+        EXPECT_TRUE(left == imported || (!isDone && left == leaseRecords(preparedRecords))) << left;
+    };
+    ASSERT_TRUE(import(nullptr));
+    const Counts all = counts;
+    eachFault(all, fileFailures(), failOne);
+    eachFault(all, memoryFailures(), failOne, someOnce);
 }
 
 }  // namespace

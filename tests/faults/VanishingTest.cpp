@@ -49,6 +49,23 @@ protected:
         return response.outcome;
     }
 
+    /** The directory returns without files: then each record is stored by the next change, or requests are refused. */
+    void returnEmptyAfter(const Fault& moment) {
+        const bool isAnswered = askWhileVanishing(&moment).rc == CMPI_RC_OK;
+        fs::remove_all(away());
+        fs::create_directory(data());
+        const testsupport::Outcome outcome = environment.ask(otherChangeOf(file())).outcome;
+        if (outcome.rc != CMPI_RC_OK) {
+            EXPECT_EQ(outcome.rc, CMPI_RC_ERR_FAILED);
+            EXPECT_THAT(outcome.message, testing::HasSubstr("The record files were removed."));
+            EXPECT_FALSE(isAnswered);
+            return;
+        }
+        environment.ask(repairOf(file()));
+        environment.unload();
+        EXPECT_EQ(now(), sorted(isAnswered ? expected.after : expected.before));
+    }
+
     void vanishAt(const Fault* moment) {
         const testsupport::Outcome outcome = askWhileVanishing(moment);
         const bool isAnswered = outcome.rc == expected.response.outcome.rc;
@@ -104,6 +121,12 @@ protected:
 TEST_P(VanishingTest, ReturnsTheExpectedOutcomeAndTheNextChangeStoresEverything) {
     vanishAt(nullptr);
     eachMoment(expected.response.counts, [&](const Fault& moment) { vanishAt(&moment); });
+}
+
+TEST_P(VanishingTest, NoRecordIsLostIfTheDirectoryReturnsEmpty) {
+    if (hasGate() && request().changes != nullptr && file() != assetFile) {
+        eachMoment(expected.response.counts, [&](const Fault& moment) { returnEmptyAfter(moment); });
+    }
 }
 
 std::string nameOfTest(const testing::TestParamInfo<VanishingTest::ParamType>& tested) {

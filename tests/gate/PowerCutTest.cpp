@@ -1,6 +1,7 @@
 #include "GateFixture.h"
 #include "SimulatedDisk.h"
 #include "durable/RecordFile.h"
+#include "support/FullDisk.h"
 
 #include <unistd.h>
 
@@ -35,15 +36,21 @@ protected:
         return results[files] = content;
     }
 
-    /** Makes a change, and simulates a power failure before and after each of its operations. */
+    /** Makes a change through the gate, and simulates power failures. */
     void change(const std::function<void()>& request) {
         gate().instanceMI();
-        Disk disk;
-        const std::string before = readFile(dataFile("Lease.dat"));
+        write(Disk(), readFile(dataFile("Lease.dat")), request);
+    }
+
+    /**
+     * Writes files, and simulates a power failure before and after each operation.
+     * @param disk the state before, in which the leases can be recovered
+     */
+    void write(Disk disk, const std::string& before, const std::function<void()>& work) {
         std::vector<Event> events;
         {
             const Recording recording;
-            request();
+            work();
             events = recording.recorded;
         }
         const std::string after = readFile(dataFile("Lease.dat"));
@@ -72,6 +79,50 @@ TEST_F(PowerCutTest, LeavesTheStateBeforeOrAfterEachChange) {
     change([&] { EXPECT_THAT(create("L3"), isAnswered(1)); });
     change([&] { EXPECT_THAT(remove("L2"), isDone()); });
     EXPECT_GT(results.size(), none + 100) << "states were tried";
+}
+
+TEST_F(PowerCutTest, LeavesTheStateBeforeAChangeThatIsRolledBack) {
+    create("L1", {named("Lessor", text("ACME Leasing"))});
+    const std::string before = readFile(dataFile("Lease.dat"));
+    change([&] {
+        const testsupport::FullDisk disk(before.size() + 10);
+        EXPECT_THAT(create("L2"), isRefused(CMPI_RC_ERR_FAILED, "disk may be full"));
+    });
+    EXPECT_EQ(readFile(dataFile("Lease.dat")), before);
+}
+
+TEST_F(PowerCutTest, LeavesARestorableFileDuringARecovery) {
+    create("L1");
+    create("L2", {named("Lessor", text("ACME Leasing"))});
+    unload();
+    const std::string complete = readFile(dataFile("Lease.dat"));
+    testsupport::writeFile(dataFile("Lease.dat"), complete.substr(0, complete.size() / 2));
+    write(Disk(), complete, [&] { gate().instanceMI(); });
+    EXPECT_EQ(readFile(dataFile("Lease.dat")), complete);
+}
+
+TEST_F(PowerCutTest, LeavesTheReplacedOrTheNewRecordsDuringAnImport) {
+    create("L1");
+    const std::string imported = readFile(dataFile("Lease.dat"));
+    create("L2");
+    unload();
+    const durable::RecordFile leases =
+        durable::recordFileIn(agentEnvironment::dataDirectory().string() + "/", "Lease.dat");
+    write(Disk(), readFile(dataFile("Lease.dat")), [&] {
+        leases.recover();
+        leases.replace(imported);
+    });
+    EXPECT_EQ(readFile(dataFile("Lease.dat")), imported);
+}
+
+TEST_F(PowerCutTest, LosesNoRecordWhoseCopyAKilledProcessDidNotSync) {
+    create("L1");
+    create("L2");
+    unload();
+    Disk disk;
+    disk.forget("Lease.dat.saved1");
+    disk.forget("Lease.dat.saved2");
+    write(disk, readFile(dataFile("Lease.dat")), [&] { EXPECT_THAT(remove("L1"), isDone()); });
 }
 
 TEST_F(PowerCutTest, LeavesTheStateBeforeARefusedChange) {

@@ -123,6 +123,27 @@ TEST_F(RecoveryTest, AnUnwritableDirectoryRefusesChangesAndIsRead) {
     EXPECT_THAT(create("L2"), isAnswered(1));
 }
 
+TEST_F(RecoveryTest, AProcessThatMustNotWriteNeitherRestoresNorReadsAnIncompleteFile) {
+    create("L1");
+    unload();
+    const std::string complete = readFile(dataFile("Lease.dat"));
+    fs::permissions(dataFile("Lease.dat"), fs::perms(0644));
+    fs::permissions(dataFile("Lease.dat.saved1"), fs::perms(0644));
+    fs::permissions(dataFile("Lease.dat.saved2"), fs::perms(0644));
+    writeFile(dataFile("Lease.dat"), "1\nL1\n");
+    agentEnvironment::forgetLog();
+    gate();
+    {
+        const UnwritableDirectory unwritable(agentEnvironment::dataDirectory());
+        EXPECT_THAT(gate().enumerateInstances(classPath(lease)), isRefused(CMPI_RC_ERR_FAILED, "are incomplete"));
+    }
+    EXPECT_EQ(readFile(dataFile("Lease.dat")), "1\nL1\n");
+    EXPECT_EQ(loggedErrors().find("restored"), std::string::npos) << loggedErrors();
+    EXPECT_THAT(identifiers(), ElementsAre("L1")) << "it may write now";
+    EXPECT_THAT(loggedErrors(), HasSubstr("It was restored from the saved copy"));
+    EXPECT_EQ(readFile(dataFile("Lease.dat")), complete);
+}
+
 /** Returns the names in the data directory. */
 std::set<std::string> namesInDirectory() {
     std::set<std::string> names;
@@ -143,7 +164,7 @@ TEST_F(RecoveryTest, AReaderReportsThatTheDirectoryVanished) {
     }
     const fs::path away = agentEnvironment::directory() / "away";
     fs::rename(agentEnvironment::dataDirectory(), away);
-    EXPECT_THAT(gate().enumerateInstances(classPath("VELKO_Lease")), isRefused(CMPI_RC_ERR_FAILED, "does not exist"));
+    EXPECT_THAT(gate().enumerateInstances(classPath("VELKO_Lease")), isRefused(CMPI_RC_ERR_FAILED, "were removed"));
     fs::rename(away, agentEnvironment::dataDirectory());
     EXPECT_THAT(identifiers(), ElementsAre("L1"));
 }

@@ -60,6 +60,12 @@ public:
         }
     }
 
+    /** Regards a file's content as not synced. */
+    void forget(const std::string& name) {
+        Data& file = data.at(names.at(name));
+        file = {{}, {{Kind::write, names.at(name), {}, {}, file.synced}}};
+    }
+
     void apply(const Event& event) {
         switch (event.kind) {
             case Kind::syncNames:

@@ -78,6 +78,45 @@ TEST_F(StorageTest, AMissingDataDirectoryRefusesChanges) {
     EXPECT_THAT(readFile(dataFile("Lease.dat")), HasSubstr("L1\n"));
 }
 
+TEST_F(StorageTest, RecordsOfAnEmptiedDirectoryAreStoredByTheNextChange) {
+    create("L1", {named("LeaseTerm", uint32(1))});
+    create("L2");
+    for (const bool isChangedBefore : {true, false}) {
+        if (!isChangedBefore) {
+            unload();
+            gate().instanceMI();
+        }
+        fs::remove_all(agentEnvironment::dataDirectory());
+        fs::create_directory(agentEnvironment::dataDirectory());
+        {
+            const FullDisk disk(10);
+            EXPECT_THAT(create("L3"), isRefused(CMPI_RC_ERR_FAILED, "Lease.dat"));
+        }
+        EXPECT_THAT(identifiers(), ElementsAre("L1", "L2"));
+        EXPECT_THAT(create("L3"), isAnswered(1));
+        EXPECT_THAT(remove("L3"), isDone());
+        unload();
+        EXPECT_THAT(identifiers(), ElementsAre("L1", "L2"));
+        EXPECT_EQ(valueIn(instanceOf("L1"), "LeaseTerm"), "1");
+    }
+}
+
+TEST_F(StorageTest, RecordsAreNotReadAgainFromADirectoryThatLacksTheirFiles) {
+    create("L1");
+    const std::string stored = readFile(dataFile("Lease.dat"));
+    unload();
+    gate().instanceMI();
+    testsupport::writeFile(dataFile("Lease.dat"), "0\n");
+    EXPECT_THAT(create("L2"), isRefused(CMPI_RC_ERR_FAILED, "It is read again"));
+    fs::remove_all(agentEnvironment::dataDirectory());
+    fs::create_directory(agentEnvironment::dataDirectory());
+    for (const Outcome& outcome : {gate().enumerateInstances(classPath(lease)), create("L2")}) {
+        EXPECT_THAT(outcome, isRefused(CMPI_RC_ERR_FAILED, "The record files were removed."));
+    }
+    testsupport::writeFile(dataFile("Lease.dat"), stored);
+    EXPECT_THAT(identifiers(), ElementsAre("L1"));
+}
+
 TEST_F(StorageTest, AFileThatCannotBeOpenedIsNamedAndNothingChanges) {
     create("L1", {named("LeaseTerm", uint32(1))});
     fs::remove(dataFile("Lease.dat"));

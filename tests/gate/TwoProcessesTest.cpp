@@ -76,6 +76,33 @@ TEST_F(TwoProcessesTest, OneReadsWhatTheOtherStores) {
     EXPECT_EQ(valueIn(instanceOf("L1"), "LeaseTerm"), "2");
 }
 
+TEST_F(TwoProcessesTest, AReaderIsRefusedUntilTheOwnerHasWrittenTheFile) {
+    OtherProcess owner({[&] { return create("L1").rc == CMPI_RC_OK; }});
+    ASSERT_TRUE(owner.does(0));
+    const std::string complete = testsupport::readFile(dataFile("Lease.dat"));
+    testsupport::writeFile(dataFile("Lease.dat"), complete.substr(0, complete.size() / 2));
+    for (int time = 0; time < 2; ++time) {
+        EXPECT_THAT(gate().enumerateInstanceNames(classPath(lease)),
+                    isRefused(CMPI_RC_ERR_FAILED, "another process is writing them"));
+    }
+    testsupport::writeFile(dataFile("Lease.dat"), complete);
+    EXPECT_THAT(identifiers(), ElementsAre("L1"));
+    testsupport::writeFile(dataFile("Lease.dat"), complete.substr(0, complete.size() / 2));
+    EXPECT_THAT(identifiers(), ElementsAre("L1")) << "as read before";
+}
+
+TEST_F(TwoProcessesTest, AForkedChildOfTheOwnerReadsWhatTheOwnerStores) {
+    create("L1");
+    OtherProcess child({[&] {
+                            return identifiers() == std::vector<std::string>{"L1", "L2"};
+                        },
+                        [&] { return create("L3").message.find("is in use by process") != std::string::npos; }});
+    create("L2");
+    EXPECT_TRUE(child.does(0));
+    EXPECT_TRUE(child.does(1));
+    EXPECT_THAT(identifiers(), ElementsAre("L1", "L2"));
+}
+
 TEST_F(TwoProcessesTest, AChangeIsRefusedWithTheNameOfTheOwnerUntilItEnds) {
     OtherProcess owner({[&] { return create("L1").rc == CMPI_RC_OK; }, [&] { return create("L2").rc == CMPI_RC_OK; }});
     ASSERT_TRUE(owner.does(0));
