@@ -68,9 +68,9 @@ const CMPIObjectPath* computerPathOf(const ClientRequest& request, const CMPIBro
     for (CMPICount index = 0; index < count; ++index) {
         CMPIString* keyName = nullptr;
         const auto data = ask<&CMPIObjectPathFT::getKeyAt>(given, index, &keyName);
-        const CMPIStatus status =
-            tell<&CMPIObjectPathFT::addKey>(path, toString(keyName).c_str(), &data.value.value, data.value.type);
-        require(data.isOk() && status.rc == CMPI_RC_OK, "name a computer", status);
+        requireOk("name a computer", data.status);
+        requireOk("name a computer",
+                  tell<&CMPIObjectPathFT::addKey>(path, toString(keyName).c_str(), &data.value.value, data.value.type));
     }
     return path;
 }

@@ -47,8 +47,8 @@ const CMPIInstance* PropertySelection::applied(const CMPIBroker* broker, const C
         const bool isPresent = answer.isOk() && (answer.value.state & (CMPI_notFound | CMPI_badValue)) == 0;
         if (isPresent && (property.isKey || has(property))) {
             const CMPIValue* value = cim::hasValue(answer.value) ? &answer.value.value : nullptr;
-            const CMPIStatus status = tell<&CMPIInstanceFT::setProperty>(made, property.name, value, answer.value.type);
-            require(status.rc == CMPI_RC_OK, "set a property", status);
+            requireOk("set a property",
+                      tell<&CMPIInstanceFT::setProperty>(made, property.name, value, answer.value.type));
         }
     }
     return made;

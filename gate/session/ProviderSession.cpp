@@ -12,8 +12,7 @@ constexpr const char* any = nullptr;
 template <auto function, class... Answer>
 void callResult(const ClientRequest& request, Answer... answer) {
     request.requireManager();
-    const CMPIStatus status = tell<function>(request.result, answer...);
-    require(status.rc == CMPI_RC_OK, "accept the answer", status);
+    requireOk("accept the answer", tell<function>(request.result, answer...));
 }
 
 template <auto function, class Answer>
