@@ -38,8 +38,8 @@ CMPIObjectPathFT LocalObject::makePathFunctions() {
         return dataOf(cim::findNamed(of(self).members, name), CMPI_keyValue, CMPI_RC_ERR_NOT_FOUND, rc);
     };
     table.getKeyAt = [](const CMPIObjectPath* self, CMPICount index, CMPIString** name, CMPIStatus* rc) {
-        auto& members = of(self).members;
-        Member* member = index < members.size() ? &members[index] : nullptr;
+        LocalObject& object = of(self);
+        Member* member = index < object.members.size() ? &object.members[index] : nullptr;
         if (name != nullptr && member != nullptr) {
             *name = member->nameString.handle();
         }
