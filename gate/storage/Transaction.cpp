@@ -134,17 +134,23 @@ void Transaction::requireNew(const std::string& identifier, const std::string& c
     }
 }
 
+/** An existing record; null if there is none. Lists the names only if the file has lost the first record's identifier.
+ */
+const CMPIInstance* Transaction::anyRecord(const std::string& content) const {
+    const std::string identifier = DataFile::firstIdentifier(content);
+    const LocalObject first(nameSpaceOf(path.path()), owner, {{cim::findNamed(owner, identifierKey), identifier}});
+    const CMPIInstance* record = session.find(first, owner);
+    const Paths others = record == nullptr ? session.names(owner) : Paths();
+    return others.empty() ? record : session.get(localPath(others.front(), owner), owner);
+}
+
 /** Refuses other read-only values than an existing record has, since all records have the same. */
 void Transaction::requireReadOnlyValues(const Values& given, const std::string& content) const {
     Values readOnly;
     std::copy_if(given.begin(), given.end(), std::back_inserter(readOnly),
                  [](const auto& value) { return !value.first->isWritable; });
-    const std::string identifier = DataFile::firstIdentifier(content);
-    if (readOnly.empty() || identifier.empty()) {
-        return;
-    }
-    const LocalObject first(nameSpaceOf(path.path()), owner, {{cim::findNamed(owner, identifierKey), identifier}});
-    if (const CMPIInstance* record = session.find(first, owner)) {
+    const CMPIInstance* record = readOnly.empty() ? nullptr : anyRecord(content);
+    if (record != nullptr) {
         diff(record, readOnly, false);
     }
 }

@@ -109,6 +109,18 @@ TEST_F(ProviderRequestsTest, ACreationGetsARecordThatItNeedsForComparison) {
     EXPECT_THAT(behindFailure(CMPI_RC_ERR_INVALID_PARAMETER, [&] { return create("L_3"); }), IsEmpty());
 }
 
+TEST_F(ProviderRequestsTest, ACreationListsTheNamesIfTheFileHasChangedTheFirstIdentifier) {
+    remove(firstNode, warranty);
+    unload();
+    const RefusalOff off;
+    create("W_1", {}, warranty);
+    const NamedValue readOnly = named("ElementName", text("mine"));
+    EXPECT_THAT(behindFailure(CMPI_RC_ERR_INVALID_PARAMETER, [&] { return create("W2", {readOnly}, warranty); }),
+                ElementsAre("GetInstance", "EnumInstanceNames", "GetInstance"));
+    EXPECT_THAT(identifiers(warranty), ElementsAre("W_1")) << "the provider was not loaded again";
+    unload();  // before the configuration is restored
+}
+
 TEST_F(ProviderRequestsTest, AModificationGetsTheInstanceBeforeAndAfter) {
     const NamedValue other = named("Lessor", text("Other"));
     EXPECT_THAT(behind([&] { return modify("L1", {other}); }),
