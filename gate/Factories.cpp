@@ -62,7 +62,7 @@ CMPIStatus guarded(Broker broker, Work work) {
 template <class Interface, auto operation>
 struct Entry;
 
-template <class Interface, class... Arguments, void (*operation)(const Request&, Arguments...)>
+template <class Interface, class... Arguments, void (*operation)(const ClientRequest&, Arguments...)>
 struct Entry<Interface, operation> {
     static CMPIStatus call(Interface*, const CMPIContext* context, const CMPIResult* result, const CMPIObjectPath* path,
                            Arguments... arguments) {
@@ -70,7 +70,7 @@ struct Entry<Interface, operation> {
         if (!active.isAdmitted) {
             return statusOf(CMPI_RC_ERR_FAILED, shuttingDown);
         }
-        const Request request{context, result, path, active.generation};
+        const ClientRequest request{context, result, path, active.generation};
         return guarded([&] { return request.brokerOrNull(); },
                        [&] {
                            request.broker();  // there must be one

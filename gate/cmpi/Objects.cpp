@@ -61,25 +61,18 @@ CMPIInstance* makeInstance(const CMPIBroker* broker, const CMPIObjectPath* path)
 
 namespace {
 
-bool isString(CMPIType type) {
-    return type == CMPI_string || type == CMPI_chars;
-}
-
-bool isInteger(CMPIType type) {
-    return (type & CMPI_INTEGER) != 0 && (type & (CMPI_ENC | CMPI_ARRAY)) == 0;
-}
-
-/** Whether a value of a type is accepted for a property of another: managers do not keep types apart strictly. */
-bool isConvertible(CMPIType given, CMPIType wanted) {
+/** Whether a value is accepted for a property of a type: managers do not keep types apart strictly. */
+bool isConvertible(const CMPIData& data, CMPIType wanted) {
+    const bool isString = data.type == CMPI_string || data.type == CMPI_chars;
     switch (wanted) {
         case CMPI_string:
-            return isString(given);
+            return isString;
         case CMPI_dateTime:
-            return given == CMPI_dateTime || isString(given);
+            return isString || data.type == CMPI_dateTime;
         case CMPI_boolean:
-            return given == CMPI_boolean;
+            return data.type == CMPI_boolean;
         default:
-            return isInteger(given);
+            return cim::digitsOf(data).has_value();
     }
 }
 
@@ -99,8 +92,7 @@ bool fits(const std::string& characters, CMPIType wanted) {
 }
 
 void add(CMPIObjectPath* path, const char* name, const CMPIValue* value, CMPIType type) {
-    const CMPIStatus status = tell<&CMPIObjectPathFT::addKey>(path, name, value, type);
-    require(status.rc == CMPI_RC_OK, "add a key", status);
+    requireOk("add a key", tell<&CMPIObjectPathFT::addKey>(path, name, value, type));
 }
 
 CMPIValue reference(const CMPIObjectPath* target) {
@@ -114,11 +106,11 @@ std::optional<std::string> convert(const CMPIData& data, const CMPIStatus& statu
     if (isAbsent(status)) {
         return std::nullopt;
     }
-    require(status.rc == CMPI_RC_OK, (std::string("return the value of ") + property.name).c_str(), status);
+    requireOk((std::string("return the value of ") + property.name).c_str(), status);
     if (!cim::hasValue(data)) {
         return std::nullopt;
     }
-    if (!isConvertible(data.type, property.type)) {
+    if (!isConvertible(data, property.type)) {
         fail(CMPI_RC_ERR_TYPE_MISMATCH, std::string(property.name) + ": the value has another type than the property.");
     }
     auto characters = cim::charactersOf(data);
@@ -131,16 +123,16 @@ std::optional<std::string> convert(const CMPIData& data, const CMPIStatus& statu
 
 /** Whether the second path has that key of the first one. */
 bool sameKey(const CMPIData& key, const char* name, const CMPIObjectPath* other) {
-    const CMPIStatus status = ask<&CMPIObjectPathFT::getKey>(other, name).status;
-    require(status.rc == CMPI_RC_OK || isAbsent(status), "return the keys of a path", status);
+    const auto found = ask<&CMPIObjectPathFT::getKey>(other, name);
+    require(found.isOk() || isAbsent(found.status), "return the keys of a path", found.status);
     if (key.type == CMPI_ref) {
         const CMPIObjectPath* target = referenceOf(other, name);
         return target != nullptr && samePath(key.value.ref, target);
     }
     const CMPIType type = key.type == CMPI_chars ? CMPI_string : key.type;
-    const Property property{name, type, true, false, nullptr};
-    const auto value = convert(key, {CMPI_RC_OK, nullptr}, property);
-    return value && value == keyOf(other, property);
+    const auto value = cim::hasValue(key) ? cim::charactersOf(key) : std::nullopt;
+    const bool isUsable = found.isOk() && cim::hasValue(found.value) && isConvertible(found.value, type);
+    return value && isUsable && value == cim::charactersOf(found.value);
 }
 
 }  // namespace
@@ -152,8 +144,7 @@ std::optional<std::string> propertyOf(const CMPIInstance* instance, const Proper
 
 std::optional<std::string> keyOf(const CMPIObjectPath* path, const Property& property) {
     const auto answer = ask<&CMPIObjectPathFT::getKey>(path, property.name);
-    const bool isUsable =
-        answer.isOk() && cim::hasValue(answer.value) && isConvertible(answer.value.type, property.type);
+    const bool isUsable = answer.isOk() && cim::hasValue(answer.value) && isConvertible(answer.value, property.type);
     return isUsable ? cim::charactersOf(answer.value) : std::nullopt;
 }
 
@@ -177,8 +168,7 @@ CMPIValue scalarFrom(const std::string& characters, CMPIType type) {
 
 void setReference(const CMPIInstance* instance, const char* name, const CMPIObjectPath* target) {
     const CMPIValue value = reference(target);
-    const CMPIStatus status = tell<&CMPIInstanceFT::setProperty>(instance, name, &value, CMPIType{CMPI_ref});
-    require(status.rc == CMPI_RC_OK, "set a property", status);
+    requireOk("set a property", tell<&CMPIInstanceFT::setProperty>(instance, name, &value, CMPIType{CMPI_ref}));
 }
 
 void addKey(CMPIObjectPath* path, const char* name, const std::string& characters) {

@@ -31,11 +31,16 @@ std::string managerFailure(const char* task, const CMPIStatus& status);
 /** Fails with managerFailure() if the object manager could not do its task. */
 void require(bool isDone, const char* task, const CMPIStatus& status = {CMPI_RC_OK, nullptr});
 
+/** The same for a task with a status. */
+inline void requireOk(const char* task, const CMPIStatus& status) {
+    require(status.rc == CMPI_RC_OK, task, status);
+}
+
 /** The result of a call that has to succeed. */
 template <auto function, class Object, class... Arguments>
 auto demand(const char* task, Object* object, Arguments... arguments) {
     const auto answer = ask<function>(object, arguments...);
-    require(answer.isOk(), task, answer.status);
+    requireOk(task, answer.status);
     return answer.value;
 }
 

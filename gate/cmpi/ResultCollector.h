@@ -6,56 +6,49 @@
 
 namespace gate {
 
-/**
- * A CMPI result that collects the provider's answers, so that they can be checked before any is returned. The answers
- * belong to the object manager, which frees them when the request ends.
- */
-struct ResultCollector {
-    ResultCollector() : handle{this, &functions} {}
-    ResultCollector(const ResultCollector&) = delete;
-    ResultCollector& operator=(const ResultCollector&) = delete;
-
+/** The provider's answer to a request. Its objects belong to the object manager, which frees them with the request. */
+struct ProviderAnswer {
     std::vector<const CMPIInstance*> instances{};
     std::vector<const CMPIObjectPath*> paths{};
     bool isDone = false;  ///< whether the provider called returnDone
-    CMPIResult handle;
+};
+
+/**
+ * A CMPI result that collects the provider's answer, so that it can be checked before any of it is returned. It has
+ * only the functions that the provider calls.
+ */
+class ResultCollector {
+public:
+    ResultCollector() = default;
+    ResultCollector(const ResultCollector&) = delete;
+    ResultCollector& operator=(const ResultCollector&) = delete;
+
+    const CMPIResult* handle() const { return &result; }
+
+    ProviderAnswer answer{};
 
 private:
-    static ResultCollector& of(const CMPIResult* result) { return *static_cast<ResultCollector*>(result->hdl); }
-
-    static constexpr CMPIStatus ok{CMPI_RC_OK, nullptr};
-    static constexpr CMPIStatus notSupported{CMPI_RC_ERR_NOT_SUPPORTED, nullptr};
-
-    static CMPIStatus release(CMPIResult*) { return ok; }
-
-    static CMPIResult* clone(const CMPIResult*, CMPIStatus* rc) {
-        if (rc != nullptr) {
-            *rc = notSupported;
-        }
-        return nullptr;
-    }
-
-    static CMPIStatus returnData(const CMPIResult*, const CMPIValue*, CMPIType) { return notSupported; }
+    static ProviderAnswer& of(const CMPIResult* result) { return static_cast<ResultCollector*>(result->hdl)->answer; }
 
     static CMPIStatus returnInstance(const CMPIResult* result, const CMPIInstance* instance) {
         of(result).instances.push_back(instance);
-        return ok;
+        return {CMPI_RC_OK, nullptr};
     }
 
     static CMPIStatus returnObjectPath(const CMPIResult* result, const CMPIObjectPath* path) {
         of(result).paths.push_back(path);
-        return ok;
+        return {CMPI_RC_OK, nullptr};
     }
 
     static CMPIStatus returnDone(const CMPIResult* result) {
         of(result).isDone = true;
-        return ok;
+        return {CMPI_RC_OK, nullptr};
     }
 
-    static CMPIStatus returnError(const CMPIResult*, const CMPIError*) { return notSupported; }
+    static inline CMPIResultFT functions{CMPIVersion200, nullptr,          nullptr,    nullptr,
+                                         returnInstance, returnObjectPath, returnDone, nullptr};
 
-    static inline CMPIResultFT functions{CMPIVersion200, release,          clone,      returnData,
-                                         returnInstance, returnObjectPath, returnDone, returnError};
+    CMPIResult result{this, &functions};
 };
 
 }  // namespace gate

@@ -40,10 +40,13 @@ struct Classes {
 /** The class of computers. Another provider serves it; each association has a computer at one end. */
 constexpr const char* computerClass = "VELKO_ComputerSystem";
 
-/** The class of that name; null for one that the MOF does not declare. */
-const Class* findClass(std::string_view name);
+/** The class of the agent, its only instance. */
+constexpr const char* agentClass = "VELKO_OstrelAgent";
 
-/** The class's property of that name; null when it has none. */
-const Property* findProperty(const Class& owner, std::string_view name);
+/** The class of that name; null for one that the MOF does not declare. */
+inline const Class* findClass(std::string_view name) {
+    const Classes classes{};
+    return cim::findNamed(classes, name);
+}
 
 }  // namespace gate

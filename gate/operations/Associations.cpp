@@ -15,11 +15,16 @@ struct Computer {
     const CMPIInstance* instance;
 };
 
-/** The two ends of an association. */
+using Computers = std::vector<Computer>;
+
+/** The two ends of an association: a computer and one of its leases or warranties, as a path or as an instance. */
 struct AssociationPair {
     Computer computer;
-    const CMPIObjectPath* element;  ///< belongs to the computer
+    const CMPIObjectPath* element;
+    const CMPIInstance* elementInstance;
 };
+
+enum class ElementForm { path, instance };
 
 using Pairs = std::vector<AssociationPair>;
 
@@ -32,7 +37,7 @@ void requireEnumerated(bool isDone, const CMPIStatus& status) {
     }
 }
 
-CMPIEnumeration* enumerateComputers(const Request& request, ProviderSession& session) {
+CMPIEnumeration* enumerateComputers(const ClientRequest& request, ProviderSession& session) {
     const CMPIBroker* broker = session.broker();
     if (broker->bft == nullptr || broker->bft->enumerateInstances == nullptr) {
         fail(CMPI_RC_ERR_FAILED, "The object manager cannot enumerate computers.");
@@ -53,25 +58,26 @@ bool hasNext(CMPIEnumeration* computers) {
 }
 
 /** A copy of the instance's path with the request's namespace, which some managers omit. */
-const CMPIObjectPath* computerPathOf(const Request& request, const CMPIBroker* broker, const CMPIInstance* instance) {
+const CMPIObjectPath* computerPathOf(const ClientRequest& request, const CMPIBroker* broker,
+                                     const CMPIInstance* instance) {
     const CMPIObjectPath* given = pathOf(instance);
-    const Property& name = *findProperty(*findClass(computerClass), "Name");
+    const Property& name = *cim::findNamed(*findClass(computerClass), "Name");
     require(keyOf(given, name).has_value(), "name a computer");
     CMPIObjectPath* path = makePath(broker, nameSpaceOf(request.path), classNameOf(given).c_str());
     const CMPICount count = keyCountOf(given);
     for (CMPICount index = 0; index < count; ++index) {
         CMPIString* keyName = nullptr;
         const auto data = ask<&CMPIObjectPathFT::getKeyAt>(given, index, &keyName);
-        const CMPIStatus status =
-            tell<&CMPIObjectPathFT::addKey>(path, toString(keyName).c_str(), &data.value.value, data.value.type);
-        require(data.isOk() && status.rc == CMPI_RC_OK, "name a computer", status);
+        requireOk("name a computer", data.status);
+        requireOk("name a computer",
+                  tell<&CMPIObjectPathFT::addKey>(path, toString(keyName).c_str(), &data.value.value, data.value.type));
     }
     return path;
 }
 
 /** Enumerates the computers in the request's namespace, each once. Releases the lock for it. */
-std::vector<Computer> knownComputers(const Request& request, ProviderSession& session) {
-    std::vector<Computer> computers;
+Computers knownComputers(const ClientRequest& request, ProviderSession& session) {
+    Computers computers;
     CMPIEnumeration* enumeration = enumerateComputers(request, session);
     while (hasNext(enumeration)) {
         const auto next = ask<&CMPIEnumerationFT::getNext>(enumeration);
@@ -91,13 +97,27 @@ std::vector<Computer> knownComputers(const Request& request, ProviderSession& se
     return computers;
 }
 
+/** The computer with the path, or none. */
+Computers computerAt(const CMPIObjectPath* path, Computers computers) {
+    const auto isOther = [&](const Computer& each) { return !samePath(each.path, path); };
+    computers.erase(std::remove_if(computers.begin(), computers.end(), isOther), computers.end());
+    return computers;
+}
+
 /** The pairs of an association, in the order of the computers. The provider knows the elements of each. */
-Pairs pairsOf(const ProviderSession& session, const std::vector<Computer>& computers, const Class& association) {
+Pairs pairsOf(const ProviderSession& session, const Computers& computers, const Class& association,
+              ElementForm form = ElementForm::path) {
     Pairs pairs;
     for (const Computer& computer : computers) {
-        const LocalObjectPath path = localPath(computer.path, *findClass(computerClass));
-        for (const CMPIObjectPath* element : session.associatorNames(path, association)) {
-            pairs.push_back({computer, element});
+        const LocalObject keys = localPath(computer.path, *findClass(computerClass));
+        if (form == ElementForm::instance) {
+            for (const CMPIInstance* instance : session.associators(keys, association)) {
+                pairs.push_back({computer, nullptr, instance});
+            }
+        } else {
+            for (const CMPIObjectPath* path : session.associatorNames(keys, association)) {
+                pairs.push_back({computer, path, nullptr});
+            }
         }
     }
     return pairs;
@@ -112,7 +132,7 @@ bool matches(const char* filter, const char* name) {
 }
 
 /** Whether a path's class is the class or, as the object manager knows, a subclass of it. */
-bool isA(const Request& request, const CMPIObjectPath* path, const char* className) {
+bool isA(const ClientRequest& request, const CMPIObjectPath* path, const char* className) {
     const CMPIBroker* broker = request.broker();
     const std::string pathsClass = classNameOf(path);
     if (sameName(pathsClass, className)) {
@@ -147,14 +167,14 @@ struct Traversal {
  * A client's restriction. Names ignore letter case; null and the empty string mean any. The role is the property of the
  * association that refers to the source, the result role the one that refers to the target.
  */
-struct AssociationFilter {
+struct TraversalFilter {
     const char* associationClass;
     const char* role;
     const char* resultRole;
 };
 
 /** The traversals that begin at the request's path and that the filter admits. */
-std::vector<Traversal> traversalsFrom(const Request& request, const AssociationFilter& filter) {
+std::vector<Traversal> traversalsFrom(const ClientRequest& request, const TraversalFilter& filter) {
     std::vector<Traversal> traversals;
     for (const Class& association : Classes()) {
         if (!association.isAssociation || !matches(filter.associationClass, association.name)) {
@@ -172,38 +192,48 @@ std::vector<Traversal> traversalsFrom(const Request& request, const AssociationF
     return traversals;
 }
 
-/** Calls `take(session, traversal, pair)` for each pair at the request's path, in one session. */
-template <class Take>
-void traverse(const Request& request, const AssociationFilter& filter, Take take) {
+/**
+ * Returns what `visit(traversal, pair)` returns for each pair at the request's path, in one session.
+ * @param form of the elements at the targets of the traversals
+ */
+template <class Answers, class Visit>
+Answers traverse(const ClientRequest& request, const TraversalFilter& filter, ElementForm form, Visit visit) {
     if (keyCountOf(request.path) == 0) {
         fail(CMPI_RC_ERR_INVALID_PARAMETER, "Associations begin at an instance: the path needs its keys.");
     }
+    Answers answers;
     const std::vector<Traversal> traversals = traversalsFrom(request, filter);
     if (traversals.empty()) {
-        return;
+        return answers;
     }
     ProviderSession session(request);
-    const std::vector<Computer> computers = knownComputers(request, session);
+    const Computers computers = knownComputers(request, session);
     for (const Traversal& traversal : traversals) {
-        for (const AssociationPair& pair : pairsOf(session, computers, *traversal.association)) {
-            if (samePath(pathAt(*traversal.source, pair), request.path)) {
-                take(session, traversal, pair);
+        const bool isFromComputer = isComputerEnd(*traversal.source);
+        const Pairs pairs = isFromComputer
+                                ? pairsOf(session, computerAt(request.path, computers), *traversal.association, form)
+                                : pairsOf(session, computers, *traversal.association);
+        for (const AssociationPair& pair : pairs) {
+            if (isFromComputer || samePath(pair.element, request.path)) {
+                answers.push_back(visit(traversal, pair));
             }
         }
     }
+    return answers;
 }
 
-/** Returns the answers that are of the result class. */
-template <class Answer, class PathOf>
-void giveOfClass(const Request& request, const char* resultClass, std::vector<Answer>& answers, PathOf pathOfAnswer) {
-    const auto isOther = [&](Answer answer) {
+/** Returns the answers that are of the result class to the client. */
+template <class Answers, class PathOf>
+void giveOfClass(const ClientRequest& request, const char* resultClass, Answers answers, PathOf pathOfAnswer) {
+    const auto isOther = [&](const auto* answer) {
         return !isAny(resultClass) && !isA(request, pathOfAnswer(answer), resultClass);
     };
     answers.erase(std::remove_if(answers.begin(), answers.end(), isOther), answers.end());
     request.give(answers);
 }
 
-const CMPIObjectPath* associationPath(const Request& request, const Class& association, const AssociationPair& pair) {
+const CMPIObjectPath* associationPath(const ClientRequest& request, const Class& association,
+                                      const AssociationPair& pair) {
     CMPIObjectPath* path = makePath(request.broker(), nameSpaceOf(request.path), association.name);
     for (const Property& end : association) {
         addReference(path, end.name, pathAt(end, pair));
@@ -212,7 +242,8 @@ const CMPIObjectPath* associationPath(const Request& request, const Class& assoc
 }
 
 /** The instance of an association. Both of its properties are keys, so a property list does not restrict it. */
-const CMPIInstance* associationInstance(const Request& request, const Class& association, const AssociationPair& pair) {
+const CMPIInstance* associationInstance(const ClientRequest& request, const Class& association,
+                                        const AssociationPair& pair) {
     CMPIInstance* instance = makeInstance(request.broker(), associationPath(request, association, pair));
     for (const Property& end : association) {
         setReference(instance, end.name, pathAt(end, pair));
@@ -221,91 +252,83 @@ const CMPIInstance* associationInstance(const Request& request, const Class& ass
 }
 
 /** Returns what `make` makes of all pairs of an association. */
-template <class Make>
-void giveAll(const Request& request, const Class& association, Make make) {
-    std::vector<decltype(make(request, association, AssociationPair{}))> answers;
-    {
-        ProviderSession session(request);
-        for (const AssociationPair& pair : pairsOf(session, knownComputers(request, session), association)) {
-            answers.push_back(make(request, association, pair));
-        }
+template <class Answers, class Make>
+Answers allOf(const ClientRequest& request, const Class& association, Make make) {
+    ProviderSession session(request);
+    Answers answers;
+    for (const AssociationPair& pair : pairsOf(session, knownComputers(request, session), association)) {
+        answers.push_back(make(request, association, pair));
     }
-    request.give(answers);
+    return answers;
 }
 
 /** Returns what `make` makes of the pairs of all associations at the request's path. */
-template <class Make>
-void giveReferences(const Request& request, const char* associationClass, const char* role, Make make) {
-    std::vector<decltype(make(request, Class{}, AssociationPair{}))> answers;
-    traverse(request, {associationClass, role, nullptr},
-             [&](const ProviderSession&, const Traversal& traversal, const AssociationPair& pair) {
-                 answers.push_back(make(request, *traversal.association, pair));
-             });
-    request.give(answers);
+template <class Answers, class Make>
+Answers referencesFrom(const ClientRequest& request, const char* associationClass, const char* role, Make make) {
+    return traverse<Answers>(request, {associationClass, role, nullptr}, ElementForm::path,
+                             [&](const Traversal& traversal, const AssociationPair& pair) {
+                                 return make(request, *traversal.association, pair);
+                             });
 }
 
-const CMPIInstance* associationAt(const Request& request, const Class& association) {
+}  // namespace
+
+void associators(const ClientRequest& request, const char* associationClass, const char* resultClass, const char* role,
+                 const char* resultRole, const char** properties) {
+    const auto instanceAt = [&](const Traversal& traversal, const AssociationPair& pair) {
+        const PropertySelection selection(properties, *findClass(traversal.target->referenceClass));
+        return selection.applied(request.broker(),
+                                 isComputerEnd(*traversal.target) ? pair.computer.instance : pair.elementInstance);
+    };
+    giveOfClass(request, resultClass,
+                traverse<Instances>(request, {associationClass, role, resultRole}, ElementForm::instance, instanceAt),
+                pathOf);
+}
+
+void associatorNames(const ClientRequest& request, const char* associationClass, const char* resultClass,
+                     const char* role, const char* resultRole) {
+    const auto targetOf = [](const Traversal& traversal, const AssociationPair& pair) {
+        return pathAt(*traversal.target, pair);
+    };
+    giveOfClass(request, resultClass,
+                traverse<Paths>(request, {associationClass, role, resultRole}, ElementForm::path, targetOf),
+                [](const CMPIObjectPath* path) { return path; });
+}
+
+void references(const ClientRequest& request, const char* associationClass, const char* role, const char**) {
+    request.give(referencesFrom<Instances>(request, associationClass, role, associationInstance));
+}
+
+void referenceNames(const ClientRequest& request, const char* associationClass, const char* role) {
+    request.give(referencesFrom<Paths>(request, associationClass, role, associationPath));
+}
+
+Instances associationInstances(const ClientRequest& request, const Class& association) {
+    return allOf<Instances>(request, association, associationInstance);
+}
+
+Paths associationPaths(const ClientRequest& request, const Class& association) {
+    return allOf<Paths>(request, association, associationPath);
+}
+
+const CMPIInstance* associationAt(const ClientRequest& request, const Class& association) {
     ProviderSession session(request);
+    const CMPIObjectPath* computer = nullptr;
     for (const Property& end : association) {
-        if (referenceOf(request.path, end.name) == nullptr) {
+        const CMPIObjectPath* target = referenceOf(request.path, end.name);
+        if (target == nullptr) {
             fail(CMPI_RC_ERR_INVALID_PARAMETER,
                  std::string("The path of a ") + association.name + " needs the key " + end.name + " as a reference.");
         }
+        computer = isComputerEnd(end) ? target : computer;
     }
-    for (const AssociationPair& pair : pairsOf(session, knownComputers(request, session), association)) {
+    for (const AssociationPair& pair :
+         pairsOf(session, computerAt(computer, knownComputers(request, session)), association)) {
         if (samePath(associationPath(request, association, pair), request.path)) {
             return associationInstance(request, association, pair);
         }
     }
     fail(CMPI_RC_ERR_NOT_FOUND, std::string("There is no such ") + association.name + ".");
-}
-
-}  // namespace
-
-void associators(const Request& request, const char* associationClass, const char* resultClass, const char* role,
-                 const char* resultRole, const char** properties) {
-    std::vector<const CMPIInstance*> answers;
-    traverse(request, {associationClass, role, resultRole},
-             [&](const ProviderSession& session, const Traversal& traversal, const AssociationPair& pair) {
-                 const Class& owner = *findClass(traversal.target->referenceClass);
-                 const CMPIInstance* instance = isComputerEnd(*traversal.target)
-                                                    ? pair.computer.instance
-                                                    : session.find(localPath(pair.element, owner), owner);
-                 if (instance != nullptr) {
-                     answers.push_back(PropertyList(properties, owner).applied(request.broker(), instance));
-                 }
-             });
-    giveOfClass(request, resultClass, answers, pathOf);
-}
-
-void associatorNames(const Request& request, const char* associationClass, const char* resultClass, const char* role,
-                     const char* resultRole) {
-    std::vector<const CMPIObjectPath*> answers;
-    traverse(request, {associationClass, role, resultRole},
-             [&](const ProviderSession&, const Traversal& traversal, const AssociationPair& pair) {
-                 answers.push_back(pathAt(*traversal.target, pair));
-             });
-    giveOfClass(request, resultClass, answers, [](const CMPIObjectPath* path) { return path; });
-}
-
-void references(const Request& request, const char* associationClass, const char* role, const char**) {
-    giveReferences(request, associationClass, role, associationInstance);
-}
-
-void referenceNames(const Request& request, const char* associationClass, const char* role) {
-    giveReferences(request, associationClass, role, associationPath);
-}
-
-void enumerateAssociations(const Request& request, const Class& association) {
-    giveAll(request, association, associationInstance);
-}
-
-void enumerateAssociationNames(const Request& request, const Class& association) {
-    giveAll(request, association, associationPath);
-}
-
-void getAssociation(const Request& request, const Class& association) {
-    request.give(std::vector{associationAt(request, association)});
 }
 
 }  // namespace gate

@@ -5,23 +5,20 @@ namespace gate {
 
 namespace {
 
-/** The class's file. Fails with CMPI_RC_ERR_NOT_SUPPORTED if its instances cannot be changed. */
-const DataFile& fileOf(const Class& owner) {
+/**
+ * The class's file. Fails with CMPI_RC_ERR_NOT_SUPPORTED if its instances cannot be changed that way.
+ * @param hasRecords whether it must be a record file, for creations and deletions
+ */
+const DataFile& fileOf(const Class& owner, bool hasRecords, const char* changed) {
     const DataFile* file = dataFileOf(owner);
-    if (file == nullptr) {
-        fail(CMPI_RC_ERR_NOT_SUPPORTED, std::string("Instances of ") + owner.name + " cannot be changed.");
+    if (file == nullptr || (hasRecords && !file->hasRecords)) {
+        fail(CMPI_RC_ERR_NOT_SUPPORTED, std::string("Instances of ") + owner.name + changed);
     }
     return *file;
 }
 
-/** The same for creations and deletions, which need a record file. */
 const DataFile& recordFileOf(const Class& owner) {
-    const DataFile* file = dataFileOf(owner);
-    if (file == nullptr || !file->hasRecords) {
-        fail(CMPI_RC_ERR_NOT_SUPPORTED,
-             std::string("Instances of ") + owner.name + " can be neither created nor deleted.");
-    }
-    return *file;
+    return fileOf(owner, true, " can be neither created nor deleted.");
 }
 
 void requireInstance(const CMPIInstance* instance) {
@@ -37,7 +34,7 @@ void requireKnownProperties(const Class& owner, const CMPIInstance* instance) {
         ask<&CMPIInstanceFT::getPropertyAt>(instance, index, &nameString);
         const std::string name = toString(nameString);
         require(!name.empty(), "name a property of the instance");
-        if (findProperty(owner, name) == nullptr) {
+        if (cim::findNamed(owner, name) == nullptr) {
             fail(CMPI_RC_ERR_NO_SUCH_PROPERTY, std::string(owner.name) + " has no property " + name + ".");
         }
     }
@@ -57,47 +54,45 @@ std::string identifierOf(const CMPIObjectPath* path, const CMPIInstance* instanc
 
 }  // namespace
 
-void createInstance(const Request& request, const CMPIInstance* instance) {
+void createInstance(const ClientRequest& request, const CMPIInstance* instance) {
     const Class& requested = request.requestedClass();
     const DataFile& file = recordFileOf(requested);
     requireInstance(instance);
     ProviderSession session(request, ProviderSession::Access::change);
-    const Property& key = *findProperty(requested, "InstanceID");
+    const Property& key = *cim::findNamed(requested, "InstanceID");
     const std::string identifier = identifierOf(request.path, instance, key, requested);
     requireKnownProperties(requested, instance);
     const Values given = valuesOf(instance, requested, [](const Property& property) { return !property.isKey; });
-    const LocalObjectPath path(nameSpaceOf(request.path), requested, {{&key, identifier}});
-    if (session.find(path, requested) != nullptr) {
-        fail(CMPI_RC_ERR_ALREADY_EXISTS, std::string(requested.name) + " " + identifier + " already exists.");
-    }
-    CMPIObjectPath* created = makePath(session.broker(), nameSpaceOf(request.path), requested.name);
+    const std::string nameSpace = nameSpaceOf(request.path);
+    CMPIObjectPath* created = makePath(session.broker(), nameSpace, requested.name);
     addKey(created, key.name, identifier);
-    const std::vector<const CMPIObjectPath*> answer{created};
+    const Paths answer{created};
+    const LocalObject path(nameSpace, requested, {{&key, identifier}});
     Transaction(session, requested, file, path).create(identifier, given, [&] { request.give(answer); });
 }
 
-void modifyInstance(const Request& request, const CMPIInstance* instance, const char** properties) {
+void modifyInstance(const ClientRequest& request, const CMPIInstance* instance, const char** properties) {
     const Class& requested = request.requestedClass();
-    const DataFile& file = fileOf(requested);
+    const DataFile& file = fileOf(requested, false, " cannot be changed.");
     requireInstance(instance);
-    const PropertyList list(properties, requested);
-    list.requireKnown();
+    const PropertySelection selection(properties, requested);
+    selection.requireKnown();
     ProviderSession session(request, ProviderSession::Access::change);
-    const LocalObjectPath path = localPath(request.path, requested);
+    const LocalObject path = localPath(request.path, requested);
     requireKnownProperties(requested, instance);
-    const Values given = valuesOf(instance, requested, [&](const Property& property) { return list.has(property); });
+    const Values given = valuesOf(instance, requested, [&](const Property& each) { return selection.has(each); });
     const CMPIInstance* current = session.get(path, requested);
-    const Values changes = diff(current, given, list.isGiven());
+    const Values changes = diff(current, given, selection.isListed());
     if (!changes.empty()) {
         Transaction(session, requested, file, path).modify(current, changes);
     }
 }
 
-void deleteInstance(const Request& request) {
+void deleteInstance(const ClientRequest& request) {
     const Class& requested = request.requestedClass();
     const DataFile& file = recordFileOf(requested);
     ProviderSession session(request, ProviderSession::Access::change);
-    const LocalObjectPath path = localPath(request.path, requested);
+    const LocalObject path = localPath(request.path, requested);
     session.get(path, requested);  // there must be one
     Transaction(session, requested, file, path).remove();
 }

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "PropertyList.h"
+#include "PropertySelection.h"
 
 // The operations of CIM. Each returns its answers through the request's result, or throws Failure or ManagerGone.
 //
@@ -11,16 +11,16 @@ namespace gate {
 
 /** @name Reads */
 ///@{
-void enumerateInstanceNames(const Request& request);
-void enumerateInstances(const Request& request, const char** properties);
-void getInstance(const Request& request, const char** properties);
+void enumerateInstanceNames(const ClientRequest& request);
+void enumerateInstances(const ClientRequest& request, const char** properties);
+void getInstance(const ClientRequest& request, const char** properties);
 ///@}
 
 /** @name Changes */
 ///@{
-void createInstance(const Request& request, const CMPIInstance* instance);
-void modifyInstance(const Request& request, const CMPIInstance* instance, const char** properties);
-void deleteInstance(const Request& request);
+void createInstance(const ClientRequest& request, const CMPIInstance* instance);
+void modifyInstance(const ClientRequest& request, const CMPIInstance* instance, const char** properties);
+void deleteInstance(const ClientRequest& request);
 ///@}
 
 /**
@@ -28,19 +28,19 @@ void deleteInstance(const Request& request);
  * References have no use for a property list: both properties of an association are keys.
  */
 ///@{
-void associators(const Request& request, const char* associationClass, const char* resultClass, const char* role,
+void associators(const ClientRequest& request, const char* associationClass, const char* resultClass, const char* role,
                  const char* resultRole, const char** properties);
-void associatorNames(const Request& request, const char* associationClass, const char* resultClass, const char* role,
-                     const char* resultRole);
-void references(const Request& request, const char* associationClass, const char* role, const char** properties);
-void referenceNames(const Request& request, const char* associationClass, const char* role);
+void associatorNames(const ClientRequest& request, const char* associationClass, const char* resultClass,
+                     const char* role, const char* resultRole);
+void references(const ClientRequest& request, const char* associationClass, const char* role, const char** properties);
+void referenceNames(const ClientRequest& request, const char* associationClass, const char* role);
 ///@}
 
-/** @name Reads of an association class */
+/** @name Answers to reads of an association class */
 ///@{
-void enumerateAssociations(const Request& request, const Class& association);
-void enumerateAssociationNames(const Request& request, const Class& association);
-void getAssociation(const Request& request, const Class& association);
+Paths associationPaths(const ClientRequest& request, const Class& association);
+Instances associationInstances(const ClientRequest& request, const Class& association);
+const CMPIInstance* associationAt(const ClientRequest& request, const Class& association);
 ///@}
 
 }  // namespace gate

@@ -1,61 +1,46 @@
 #include "ProviderSession.h"
 
-#include "gate/cmpi/ResultCollector.h"
-
 #include <algorithm>
 
 namespace gate {
 
 namespace {
 
+constexpr const char** allProperties = nullptr;
+constexpr const char* any = nullptr;
+
 template <auto function, class... Answer>
-void callResult(const Request& request, Answer... answer) {
+void callResult(const ClientRequest& request, Answer... answer) {
     request.requireManager();
-    const CMPIStatus status = tell<function>(request.result, answer...);
-    require(status.rc == CMPI_RC_OK, "accept the answer", status);
+    requireOk("accept the answer", tell<function>(request.result, answer...));
 }
 
 template <auto function, class Answer>
-void giveAll(const Request& request, const std::vector<Answer>& answers) {
+void giveAll(const ClientRequest& request, const std::vector<Answer>& answers) {
     for (const Answer& answer : answers) {
         callResult<function>(request, answer);
     }
     callResult<&CMPIResultFT::returnDone>(request);
 }
 
-void requireOk(const CMPIStatus& status) {
-    if (status.rc != CMPI_RC_OK) {
-        const std::string reason = toString(status.msg);
-        fail(status.rc, reason.empty() ? "The provider returned code " + std::to_string(status.rc) + "." : reason);
-    }
+[[noreturn]] void failUnfinished() {
+    fail(CMPI_RC_ERR_FAILED, "The provider did not finish its answer; see the agent's log at level 3000.");
 }
 
-void requireDone(const ResultCollector& result) {
-    if (!result.isDone) {
-        fail(CMPI_RC_ERR_FAILED, "The provider did not finish its answer; see the agent's log at level 3000.");
-    }
+const CMPIInstance* firstOf(const Instances& instances) {
+    return instances.empty() ? nullptr : instances.front();
 }
 
-/** Calls a function of one of the provider's interfaces. */
-template <auto function, class Interface, class... Arguments>
-void call(ResultCollector& result, const Request& request, Interface* interface, Arguments... arguments) {
-    requireOk((interface->ft->*function)(interface, request.context, &result.handle, arguments...));
-    request.requireManager();
+/** Whether an instance has the keys of a path. */
+bool hasKeys(const CMPIInstance* instance, const CMPIObjectPath* path, const Class& owner) {
+    return std::all_of(owner.begin(), owner.end(), [&](const Property& property) {
+        return !property.isKey || propertyOf(instance, property) == keyOf(path, property);
+    });
 }
-
-/** The same for a function that returns objects, which the provider omits where it cannot create them. */
-template <auto function, class Interface, class... Arguments>
-void collect(ResultCollector& result, const Request& request, Interface* interface, Arguments... arguments) {
-    theConnection.wrappedBroker().forgetFailures();
-    call<function>(result, request, interface, arguments...);
-    require(!theConnection.wrappedBroker().hasFailed(), "create the paths and instances of the answer");
-}
-
-constexpr const char** allProperties = nullptr;
 
 }  // namespace
 
-const CMPIBroker* Request::broker() const {
+const CMPIBroker* ClientRequest::broker() const {
     const CMPIBroker* found = brokerOrNull();
     if (found == nullptr) {
         throw ManagerGone{};
@@ -63,11 +48,7 @@ const CMPIBroker* Request::broker() const {
     return found;
 }
 
-const CMPIBroker* Request::brokerOrNull() const {
-    return hasManager() ? theConnection.broker() : nullptr;
-}
-
-const Class& Request::requestedClass() const {
+const Class& ClientRequest::requestedClass() const {
     const std::string name = classNameOf(path);
     const Class* found = findClass(name);
     if (found == nullptr || sameName(name, computerClass)) {
@@ -76,15 +57,15 @@ const Class& Request::requestedClass() const {
     return *found;
 }
 
-void Request::give(const std::vector<const CMPIInstance*>& instances) const {
+void ClientRequest::give(const Instances& instances) const {
     giveAll<&CMPIResultFT::returnInstance>(*this, instances);
 }
 
-void Request::give(const std::vector<const CMPIObjectPath*>& paths) const {
+void ClientRequest::give(const Paths& paths) const {
     giveAll<&CMPIResultFT::returnObjectPath>(*this, paths);
 }
 
-ProviderSession::ProviderSession(const Request& itsRequest, Access access) : request(itsRequest) {
+ProviderSession::ProviderSession(const ClientRequest& itsRequest, Access access) : request(itsRequest) {
     request.broker();  // there must be one
     if (access == Access::change) {
         theConnection.requireOwner(guard);
@@ -92,73 +73,89 @@ ProviderSession::ProviderSession(const Request& itsRequest, Access access) : req
     theConnection.requireCurrent(guard);
 }
 
-ProviderSession::Paths ProviderSession::names(const LocalObjectPath& classPath) const {
+/** Calls a function of one of the provider's interfaces. */
+template <auto function, class Interface, class... Arguments>
+ProviderAnswer ProviderSession::call(Interface* interface, const LocalObject& path, Arguments... arguments) const {
     ResultCollector result;
-    collect<&CMPIInstanceMIFT::enumerateInstanceNames>(result, request, theConnection.instanceInterface(),
-                                                       classPath.handle());
-    requireDone(result);
-    return result.paths;
-}
-
-ProviderSession::Instances ProviderSession::instances(const LocalObjectPath& classPath) const {
-    ResultCollector result;
-    collect<&CMPIInstanceMIFT::enumerateInstances>(result, request, theConnection.instanceInterface(),
-                                                   classPath.handle(), allProperties);
-    requireDone(result);
-    return result.instances;
-}
-
-ProviderSession::Paths ProviderSession::associatorNames(const LocalObjectPath& path, const Class& association) const {
-    ResultCollector result;
-    const char* const any = nullptr;
-    collect<&CMPIAssociationMIFT::associatorNames>(result, request, theConnection.associationInterface(), path.handle(),
-                                                   association.name, any, any, any);
-    requireDone(result);
-    return result.paths;
-}
-
-const CMPIInstance* ProviderSession::find(const LocalObjectPath& path, const Class& owner) const {
-    ResultCollector result;
-    collect<&CMPIInstanceMIFT::getInstance>(result, request, theConnection.instanceInterface(), path.handle(),
-                                            allProperties);
-    if (result.instances.empty() && !result.isDone && isListed(path, owner)) {
-        requireDone(result);
+    theConnection.wrappedBroker().forgetFailures();
+    const CMPIStatus status =
+        (interface->ft->*function)(interface, request.context, result.handle(), path.path(), arguments...);
+    if (status.rc != CMPI_RC_OK) {
+        const std::string reason = toString(status.msg);
+        fail(status.rc, reason.empty() ? "The provider returned code " + std::to_string(status.rc) + "." : reason);
     }
-    return result.instances.empty() ? nullptr : result.instances.front();
+    request.requireManager();
+    return std::move(result.answer);
 }
 
-/** Whether an instance exists: the provider completes its response neither after an error nor for a missing one. */
-bool ProviderSession::isListed(const LocalObjectPath& path, const Class& owner) const {
-    const Paths listed = names(LocalObjectPath(nameSpaceOf(path.handle()), owner));
-    return std::any_of(listed.begin(), listed.end(), [&](const auto* each) { return samePath(each, path.handle()); });
+/** The same for a function that ends its answer, and that omits the objects that it cannot create. */
+template <auto function, class Interface, class... Arguments>
+ProviderAnswer ProviderSession::read(Interface* interface, const LocalObject& path, Arguments... arguments) const {
+    ProviderAnswer answer = call<function>(interface, path, arguments...);
+    require(!theConnection.wrappedBroker().hasFailed(), "create the paths and instances of the answer");
+    if (!answer.isDone) {
+        failUnfinished();
+    }
+    return answer;
 }
 
-const CMPIInstance* ProviderSession::get(const LocalObjectPath& path, const Class& owner) const {
-    const CMPIInstance* instance = find(path, owner);
+Paths ProviderSession::names(const Class& owner) const {
+    const LocalObject path(nameSpaceOf(request.path), owner);
+    return read<&CMPIInstanceMIFT::enumerateInstanceNames>(theConnection.instanceInterface(), path).paths;
+}
+
+Instances ProviderSession::instances(const Class& owner) const {
+    const LocalObject path(nameSpaceOf(request.path), owner);
+    return read<&CMPIInstanceMIFT::enumerateInstances>(theConnection.instanceInterface(), path, allProperties)
+        .instances;
+}
+
+Paths ProviderSession::associatorNames(const LocalObject& computer, const Class& association) const {
+    return read<&CMPIAssociationMIFT::associatorNames>(theConnection.associationInterface(), computer, association.name,
+                                                       any, any, any)
+        .paths;
+}
+
+Instances ProviderSession::associators(const LocalObject& computer, const Class& association) const {
+    return read<&CMPIAssociationMIFT::associators>(theConnection.associationInterface(), computer, association.name,
+                                                   any, any, any, allProperties)
+        .instances;
+}
+
+const CMPIInstance* ProviderSession::find(const LocalObject& keys, const Class& owner) const {
+    if (sameName(owner.name, agentClass)) {
+        // A get does not end its answer for other keys than the only instance's, as after an error.
+        const CMPIInstance* agent = firstOf(instances(owner));
+        return agent != nullptr && hasKeys(agent, keys.path(), owner) ? agent : nullptr;
+    }
+    return firstOf(
+        read<&CMPIInstanceMIFT::getInstance>(theConnection.instanceInterface(), keys, allProperties).instances);
+}
+
+const CMPIInstance* ProviderSession::get(const LocalObject& keys, const Class& owner) const {
+    const CMPIInstance* instance = find(keys, owner);
     if (instance == nullptr) {
         fail(CMPI_RC_ERR_NOT_FOUND, std::string("There is no such ") + owner.name + ".");
     }
     return instance;
 }
 
-void ProviderSession::create(const LocalObjectPath& path) {
-    ResultCollector result;
-    const LocalInstance ignored(Values{});  // the provider reads the path only
-    collect<&CMPIInstanceMIFT::createInstance>(result, request, theConnection.instanceInterface(), path.handle(),
-                                               ignored.handle());
-    requireDone(result);
+const CMPIInstance* ProviderSession::create(const LocalObject& keys) {
+    // The provider ignores the instance.
+    const CMPIInstance* created = firstOf(
+        read<&CMPIInstanceMIFT::createInstance>(theConnection.instanceInterface(), keys, keys.instance()).instances);
+    if (created == nullptr) {
+        failUnfinished();
+    }
+    return created;
 }
 
-void ProviderSession::modify(const LocalObjectPath& path, const Values& values) {
-    ResultCollector result;
-    const LocalInstance instance(values);
-    call<&CMPIInstanceMIFT::modifyInstance>(result, request, theConnection.instanceInterface(), path.handle(),
-                                            instance.handle(), allProperties);
+void ProviderSession::modify(const LocalObject& keys, const LocalObject& values) {
+    call<&CMPIInstanceMIFT::modifyInstance>(theConnection.instanceInterface(), keys, values.instance(), allProperties);
 }
 
-void ProviderSession::remove(const LocalObjectPath& path) {
-    ResultCollector result;
-    call<&CMPIInstanceMIFT::deleteInstance>(result, request, theConnection.instanceInterface(), path.handle());
+void ProviderSession::remove(const LocalObject& keys) {
+    call<&CMPIInstanceMIFT::deleteInstance>(theConnection.instanceInterface(), keys);
 }
 
 }  // namespace gate

@@ -1,15 +1,19 @@
 #pragma once
 
 #include "ProviderConnection.h"
-#include "gate/cmpi/LocalObjects.h"
+#include "gate/cmpi/LocalObject.h"
+#include "gate/cmpi/ResultCollector.h"
 
 #include <cstddef>
 #include <vector>
 
 namespace gate {
 
-/** The arguments of a request, which belong to the object manager. */
-struct Request {
+using Instances = std::vector<const CMPIInstance*>;
+using Paths = std::vector<const CMPIObjectPath*>;
+
+/** The arguments of a client's request, which belong to the object manager. */
+struct ClientRequest {
     const CMPIContext* context;
     const CMPIResult* result;
     const CMPIObjectPath* path;
@@ -28,7 +32,7 @@ struct Request {
     const CMPIBroker* broker() const;
 
     /** The same, but null if there is none. */
-    const CMPIBroker* brokerOrNull() const;
+    const CMPIBroker* brokerOrNull() const { return hasManager() ? theConnection.broker() : nullptr; }
 
     /** The path's class. Fails with CMPI_RC_ERR_INVALID_CLASS if the provider does not serve it. */
     const Class& requestedClass() const;
@@ -39,15 +43,15 @@ struct Request {
      * accept one.
      */
     ///@{
-    void give(const std::vector<const CMPIInstance*>& instances) const;
-    void give(const std::vector<const CMPIObjectPath*>& paths) const;
+    void give(const Instances& instances) const;
+    void give(const Paths& paths) const;
     ///@}
 };
 
 /**
- * A request's access to the provider, through the provider's own function tables. Holds the request lock, so no other
- * request runs in the provider, except while the provider or releaseFor() waits for the object manager. Throws
- * ManagerGone if that ends.
+ * A request's access to the provider, through the provider's own function tables. Each function except releaseFor() is
+ * one request of the provider. Holds the request lock, so no other request runs in the provider, except while the
+ * provider or releaseFor() waits for the object manager. Throws ManagerGone if that ends.
  *
  * An object manager may crash while a client's object is read: SFCB does for a string that was sent as an integer.
  * Begin the session before you read a client's keys and values: then no data file is being written.
@@ -57,29 +61,35 @@ struct Request {
  */
 class ProviderSession {
 public:
-    using Paths = std::vector<const CMPIObjectPath*>;
-    using Instances = std::vector<const CMPIInstance*>;
-
     enum class Access { read, change };
 
     /** Begins the session. For a change, this process must own the data directory. */
-    explicit ProviderSession(const Request& itsRequest, Access access = Access::read);
+    explicit ProviderSession(const ClientRequest& itsRequest, Access access = Access::read);
 
     const CMPIBroker* broker() const { return request.broker(); }
 
-    Paths names(const LocalObjectPath& classPath) const;
-    Instances instances(const LocalObjectPath& classPath) const;
-    Paths associatorNames(const LocalObjectPath& path, const Class& association) const;
+    /** @name All instances of a class, in the request's namespace */
+    ///@{
+    Paths names(const Class& owner) const;
+    Instances instances(const Class& owner) const;
+    ///@}
 
-    /** The instance; null if there is none. */
-    const CMPIInstance* find(const LocalObjectPath& path, const Class& owner) const;
+    /** @name The leases or warranties of a computer, whose path has its keys */
+    ///@{
+    Paths associatorNames(const LocalObject& computer, const Class& association) const;
+    Instances associators(const LocalObject& computer, const Class& association) const;
+    ///@}
 
-    /** The instance. Fails with CMPI_RC_ERR_NOT_FOUND if there is none. */
-    const CMPIInstance* get(const LocalObjectPath& path, const Class& owner) const;
+    /** The instance with the keys; null if there is none. */
+    const CMPIInstance* find(const LocalObject& keys, const Class& owner) const;
 
-    void create(const LocalObjectPath& path);
-    void modify(const LocalObjectPath& path, const Values& values);
-    void remove(const LocalObjectPath& path);
+    /** The instance with the keys. Fails with CMPI_RC_ERR_NOT_FOUND if there is none. */
+    const CMPIInstance* get(const LocalObject& keys, const Class& owner) const;
+
+    /** Returns the new instance, which has default values. Fails if there is an instance with the keys. */
+    const CMPIInstance* create(const LocalObject& keys);
+    void modify(const LocalObject& keys, const LocalObject& values);
+    void remove(const LocalObject& keys);
 
     /** Marks the provider's tables as wrong: it is loaded again before the next request. */
     void setOutdated() const { theConnection.setOutdated(); }
@@ -95,10 +105,13 @@ public:
     }
 
 private:
-    bool isListed(const LocalObjectPath& path, const Class& owner) const;
+    template <auto function, class Interface, class... Arguments>
+    ProviderAnswer call(Interface* interface, const LocalObject& path, Arguments... arguments) const;
+    template <auto function, class Interface, class... Arguments>
+    ProviderAnswer read(Interface* interface, const LocalObject& path, Arguments... arguments) const;
 
     LockGuard guard;
-    const Request& request;
+    const ClientRequest& request;
 };
 
 }  // namespace gate

@@ -1,6 +1,5 @@
 #include "RequestLock.h"
 
-#include <pthread.h>
 #include <unistd.h>
 
 #include <utility>
@@ -19,11 +18,35 @@ thread_local bool isHeldHere = false;
 
 RequestLock theRequestLock;
 
+/** A waiting thread, as an element of a list. */
 struct RequestLock::Waiter {
-    std::condition_variable wakeUp{};
+    enum class Result { none, admitted, refused };
+
+    /** Wakes the thread. Called with the mutex locked, so that the waiter still exists. */
+    void end(Result itsResult) {
+        result = itsResult;
+        wakeUp.notify_one();
+    }
+
+    void appendTo(Waiter*& list) {
+        Waiter** link = &list;
+        while (*link != nullptr) {
+            link = &(*link)->next;
+        }
+        *link = this;
+    }
+
+    void removeFrom(Waiter*& list) {
+        Waiter** link = &list;
+        while (*link != this) {
+            link = &(*link)->next;
+        }
+        *link = next;
+    }
+
     IfClosed ifClosed = IfClosed::fail;
-    bool isAdmitted = false;
-    bool isRefused = false;
+    Result result = Result::none;
+    std::condition_variable wakeUp{};
     Waiter* next = nullptr;
 };
 
@@ -65,9 +88,9 @@ bool RequestLock::waitForLock(std::unique_lock<std::mutex>& lock, IfClosed ifClo
     if (canWait && (isHeld || state == State::closed)) {
         Waiter self;
         self.ifClosed = ifClosed;
-        enqueue(self);
-        self.wakeUp.wait(lock, [&] { return self.isAdmitted || self.isRefused; });
-        isHeldHere = self.isAdmitted;
+        self.appendTo(waiters);
+        self.wakeUp.wait(lock, [&] { return self.result != Waiter::Result::none; });
+        isHeldHere = self.result == Waiter::Result::admitted;
     } else {
         isHeldHere = canWait;
         isHeld = isHeld || canWait;
@@ -75,25 +98,15 @@ bool RequestLock::waitForLock(std::unique_lock<std::mutex>& lock, IfClosed ifClo
     return isHeldHere;
 }
 
-void RequestLock::enqueue(Waiter& waiter) {
-    (queue.first == nullptr ? queue.first : queue.last->next) = &waiter;
-    queue.last = &waiter;
-    ++queue.length;
-}
-
 /** Empties the queue, except for the threads that wait for a closed lock. */
 void RequestLock::refuseWaiters() {
-    Waiter* next = queue.first;
-    queue = {};
-    while (next != nullptr) {
-        Waiter& waiter = *next;
-        next = waiter.next;
-        waiter.next = nullptr;
+    for (Waiter** link = &waiters; *link != nullptr;) {
+        Waiter& waiter = **link;
         if (waiter.ifClosed == IfClosed::wait) {
-            enqueue(waiter);
+            link = &waiter.next;
         } else {
-            waiter.isRefused = true;
-            waiter.wakeUp.notify_one();  // with the mutex locked, so that the waiter still exists
+            *link = waiter.next;
+            waiter.end(Waiter::Result::refused);
         }
     }
 }
@@ -108,19 +121,10 @@ void RequestLock::release() noexcept {
 
 /** Passes the lock directly to the longest waiter, so that a newcomer cannot overtake it. */
 void RequestLock::admitNext() {
-    if (queue.first == nullptr || state == State::closed) {
-        return;
+    if (waiters != nullptr && state != State::closed) {
+        isHeld = true;
+        std::exchange(waiters, waiters->next)->end(Waiter::Result::admitted);
     }
-    Waiter& next = *queue.first;
-    queue.first = next.next;
-    --queue.length;
-    isHeld = true;
-    next.isAdmitted = true;
-    next.wakeUp.notify_one();  // with the mutex locked, so that the waiter still exists
-}
-
-bool RequestLock::isFreeForCaller() const {
-    return !isHeld || isHeldHere;
 }
 
 void RequestLock::notifyClosers() {
@@ -131,8 +135,7 @@ void RequestLock::notifyClosers() {
 
 bool RequestLock::close(std::chrono::milliseconds drainTimeout, Closing closing,
                         const std::function<void()>& atEnd) noexcept {
-    const pid_t itsProcess = process;
-    if (itsProcess != 0 && itsProcess != getpid()) {
+    if (process != 0 && process != getpid()) {
         return false;  // the threads that hold the lock and the mutex are not in this process
     }
     const CancellationDisabled cancellationDisabled;
@@ -142,28 +145,16 @@ bool RequestLock::close(std::chrono::milliseconds drainTimeout, Closing closing,
         return false;
     }
     state = State::closing;
-    const std::size_t before = timesClosed;
-    const auto isClosedByOther = [&] { return timesClosed != before; };
     Waiter self;
-    self.next = closers;
-    closers = &self;
+    self.appendTo(closers);
+    const auto isClosedByOther = [&, before = generation()] { return timesClosed != before; };
     self.wakeUp.wait_for(lock, drainTimeout, [&] { return requests <= requestsHere || isClosedByOther(); });
-    self.wakeUp.wait(lock, [&] { return isFreeForCaller() || isClosedByOther(); });
-    const bool isMine = !isClosedByOther();
-    if (isMine) {
-        finishClosing(lock, atEnd);
+    self.wakeUp.wait(lock, [&] { return !isHeld || isHeldHere || isClosedByOther(); });
+    self.removeFrom(closers);
+    if (isClosedByOther()) {
+        return false;
     }
-    Waiter** link = &closers;
-    while (*link != &self) {
-        link = &(*link)->next;
-    }
-    *link = self.next;
-    return isMine;
-}
-
-/** Calls atEnd with the lock held, so that no other closer and no returning request acquires it meanwhile. */
-void RequestLock::finishClosing(std::unique_lock<std::mutex>& lock, const std::function<void()>& atEnd) {
-    const bool wasHeld = std::exchange(isHeld, true);
+    const bool wasHeld = std::exchange(isHeld, true);  // no other closer and no returning request acquires it
     if (atEnd) {
         lock.unlock();
         atEnd();
@@ -174,6 +165,7 @@ void RequestLock::finishClosing(std::unique_lock<std::mutex>& lock, const std::f
     ++timesClosed;
     refuseWaiters();
     notifyClosers();
+    return true;
 }
 
 bool RequestLock::open() noexcept {
@@ -192,26 +184,13 @@ bool RequestLock::hasOtherRequests() const noexcept {
     return requests > requestsHere;
 }
 
-std::size_t RequestLock::waiting() const noexcept {
+std::size_t RequestLock::count(Waiter* const& first) const noexcept {
     const std::lock_guard<std::mutex> lock(mutex);
-    return queue.length;
-}
-
-std::size_t RequestLock::closing() const noexcept {
-    const std::lock_guard<std::mutex> lock(mutex);
-    std::size_t count = 0;
-    for (const Waiter* closer = closers; closer != nullptr; closer = closer->next) {
-        ++count;
+    std::size_t length = 0;
+    for (const Waiter* waiter = first; waiter != nullptr; waiter = waiter->next) {
+        ++length;
     }
-    return count;
-}
-
-CancellationDisabled::CancellationDisabled() noexcept {
-    pthread_setcancelstate(PTHREAD_CANCEL_DISABLE, &before);
-}
-
-CancellationDisabled::~CancellationDisabled() {
-    pthread_setcancelstate(before, &before);
+    return length;
 }
 
 }  // namespace gate

@@ -2,6 +2,7 @@
 
 #include "gate/cmpi/Failure.h"
 
+#include <pthread.h>
 #include <sys/types.h>
 
 #include <atomic>
@@ -22,7 +23,8 @@ namespace gate {
  * A lock that is closing admits no new request, and serves those that hold it, wait for it or reacquire it. Once it is
  * closed, no thread holds it; a request that reacquires it fails, or waits until it is opened again.
  *
- * It is never destroyed, so that a late request can use it.
+ * It is never destroyed, so that a late request can use it. Therefore each waiting thread has its own condition
+ * variable on its stack.
  */
 class RequestLock {
 public:
@@ -65,29 +67,20 @@ public:
     bool hasOtherRequests() const noexcept;
 
     /** The number of threads that wait for the lock. */
-    std::size_t waiting() const noexcept;
+    std::size_t waiting() const noexcept { return count(waiters); }
     /** The number of threads that wait in close(). */
-    std::size_t closing() const noexcept;
+    std::size_t closing() const noexcept { return count(closers); }
 
 private:
     enum class State { open, closing, closed };
     enum class IfClosed { fail, wait };
     struct Waiter;
 
-    /** The waiting threads, in order. Each waiter is on the stack of its thread. */
-    struct Queue {
-        Waiter* first = nullptr;
-        Waiter* last = nullptr;
-        std::size_t length = 0;
-    };
-
     bool waitForLock(std::unique_lock<std::mutex>& lock, IfClosed ifClosed);
-    void enqueue(Waiter& waiter);
     void refuseWaiters();
     void admitNext();
-    bool isFreeForCaller() const;
-    void finishClosing(std::unique_lock<std::mutex>& lock, const std::function<void()>& atEnd);
     void notifyClosers();
+    std::size_t count(Waiter* const& first) const noexcept;
 
     mutable std::mutex mutex{};
     std::atomic<State> state{State::open};  ///< changed with the mutex locked
@@ -96,8 +89,8 @@ private:
     bool isHeld = false;
     std::size_t requests = 0;
     std::atomic<pid_t> process{0};  ///< of the latest request
-    Queue queue{};
-    Waiter* closers = nullptr;  ///< the threads that wait in close()
+    Waiter* waiters = nullptr;      ///< the threads that wait for the lock, in order
+    Waiter* closers = nullptr;      ///< the threads that wait in close()
 };
 
 /** The lock of the provider, of which a process has one. */
@@ -122,8 +115,8 @@ public:
 /** Disables the cancellation of the calling thread, which would end the process or leave a file incomplete. */
 class CancellationDisabled {
 public:
-    CancellationDisabled() noexcept;
-    ~CancellationDisabled();
+    CancellationDisabled() noexcept { pthread_setcancelstate(PTHREAD_CANCEL_DISABLE, &before); }
+    ~CancellationDisabled() { pthread_setcancelstate(before, &before); }
     CancellationDisabled(const CancellationDisabled&) = delete;
     CancellationDisabled& operator=(const CancellationDisabled&) = delete;
 

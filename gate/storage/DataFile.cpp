@@ -11,9 +11,11 @@
 #include <unistd.h>
 
 #include <algorithm>
+#include <cctype>
 #include <cerrno>
 #include <filesystem>
 #include <iterator>
+#include <sstream>
 #include <system_error>
 
 namespace gate {
@@ -126,13 +128,31 @@ bool DataFile::isStored() const {
     return onFiles([&] { return recordFileOf(*this).isStored(); });
 }
 
-FileState DataFile::begin(bool hasSteps) const {
-    FileState before = state();
+bool DataFile::mayHave(const std::string& content, std::string identifier) const {
+    std::replace(identifier.begin(), identifier.end(), ' ', '_');
+    const auto isOutside = [&](std::size_t position) {
+        return position >= content.size() || std::isspace(static_cast<unsigned char>(content[position])) != 0;
+    };
+    std::size_t found = content.find(identifier);
+    while (found != std::string::npos && !(isOutside(found - 1) && isOutside(found + identifier.size()))) {
+        found = content.find(identifier, found + 1);
+    }
+    return found != std::string::npos || !recordFileOf(*this).isComplete(content);
+}
+
+std::string DataFile::firstIdentifier(const std::string& content) {
+    std::istringstream words(content);
+    std::string identifier;
+    words >> identifier >> identifier;
+    std::replace(identifier.begin(), identifier.end(), '_', ' ');
+    return words ? identifier : std::string();
+}
+
+void DataFile::begin(FileState& before, bool hasSteps) const {
     before.restorable = before.content;
     if (hasRecords) {
         before.restorable = onFiles([&] { return recordFileOf(*this).prepare(before.content, hasSteps); });
     }
-    return before;
 }
 
 void DataFile::commit(const FileState& before, bool mustDiffer, const std::string* identifier) const {

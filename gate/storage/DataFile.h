@@ -43,10 +43,16 @@ struct DataFile {
     /** Whether the record file needs no recovery and has this number of records. */
     bool hasCount(std::size_t count) const;
 
+    /** Whether a record may have the identifier: the record file is incomplete, or a word of it is the identifier. */
+    bool mayHave(const std::string& content, std::string identifier) const;
+
+    /** The identifier of the first record; empty if there is none. */
+    static std::string firstIdentifier(const std::string& content);
+
     /** @name Storing a change: begin(), the provider's writing, then commit() or rollBack() */
     ///@{
-    /** Returns the state before the change. @param hasSteps whether the change writes the file more than once */
-    FileState begin(bool hasSteps) const;
+    /** Makes the current state restorable. @param hasSteps whether the change writes the file more than once */
+    void begin(FileState& before, bool hasSteps) const;
 
     /**
      * Syncs the file and the saved copy. Fails if the file is incomplete, or must differ from a state but does not.
@@ -54,7 +60,7 @@ struct DataFile {
      */
     void commit(const FileState& before, bool mustDiffer, const std::string* identifier = nullptr) const;
 
-    /** Restores the file to the state that begin() returned. */
+    /** Restores the file to the state that was passed to begin(). */
     void rollBack(const FileState& before) const;
     ///@}
 };

@@ -22,8 +22,15 @@ std::size_t sizeOf(const Values& values) {
 }  // namespace
 
 Transaction::Transaction(ProviderSession& itsSession, const Class& itsClass, const DataFile& itsFile,
-                         const LocalObjectPath& itsPath)
+                         const LocalObject& itsPath)
     : session(itsSession), owner(itsClass), file(itsFile), path(itsPath) {}
+
+/** Returns the state of the file before a change. Fails if the change cannot be written or would lose records. */
+FileState Transaction::open(std::size_t growth) const {
+    file.requireWritable(growth);
+    requireTable();
+    return file.state();
+}
 
 /**
  * Calls `change(before)`, which makes a change, checks it and commits it. If it fails, rolls the change back and passes
@@ -31,10 +38,8 @@ Transaction::Transaction(ProviderSession& itsSession, const Class& itsClass, con
  * @param hasSteps whether the file is written more than once
  */
 template <class Change>
-void Transaction::run(std::size_t growth, bool hasSteps, Change change) const {
-    file.requireWritable(growth);
-    requireTable();
-    const FileState before = file.begin(hasSteps);
+void Transaction::run(FileState before, bool hasSteps, Change change) const {
+    file.begin(before, hasSteps);
     try {
         change(before);
     } catch (Failure& failure) {
@@ -68,12 +73,13 @@ std::string Transaction::rollBack(const FileState& before) const {
 }
 
 void Transaction::create(const std::string& identifier, const Values& given, const std::function<void()>& returnPath) {
-    requireRoundTrip(file, *findProperty(owner, identifierKey), identifier);
+    requireRoundTrip(file, *cim::findNamed(owner, identifierKey), identifier);
     requireRoundTrip(file, given);
-    requireReadOnlyValues(given);
-    run(identifier.size() + 1 + sizeOf(given), !given.empty(), [&](const FileState& before) {
-        session.create(path);
-        const CMPIInstance* current = session.get(path, owner);
+    const FileState start = open(identifier.size() + 1 + sizeOf(given));
+    requireNew(identifier, start.content);
+    requireReadOnlyValues(given, start.content);
+    run(start, !given.empty(), [&](const FileState& before) {
+        const CMPIInstance* current = session.create(path);
         const Values changes = diff(current, given, false);
         const FileState created = altersFile(file, current, changes) ? file.state() : before;
         if (!changes.empty()) {
@@ -86,14 +92,14 @@ void Transaction::create(const std::string& identifier, const Values& given, con
 
 void Transaction::modify(const CMPIInstance* current, const Values& changes) {
     requireRoundTrip(file, changes);
-    run(sizeOf(changes), false, [&](const FileState& before) {
+    run(open(sizeOf(changes)), false, [&](const FileState& before) {
         apply(current, changes);
         file.commit(before, altersFile(file, current, changes));
     });
 }
 
 void Transaction::remove() {
-    run(0, false, [&](const FileState& before) {
+    run(open(0), false, [&](const FileState& before) {
         session.remove(path);
         file.commit(before, true);
     });
@@ -101,7 +107,7 @@ void Transaction::remove() {
 
 /** Makes the changes. Fails unless the provider has them. */
 void Transaction::apply(const CMPIInstance* current, const Values& changes) const {
-    session.modify(path, valuesToSend(owner, current, changes));
+    session.modify(path, LocalObject({}, owner, valuesToSend(owner, current, changes)));
     requireChanged(owner, file, current, session.get(path, owner), changes);
 }
 
@@ -113,7 +119,7 @@ void Transaction::requireTable() const {
     if (!file.hasRecords || (theConnection.isVerified(owner) && file.isStored())) {
         return;
     }
-    const ProviderSession::Paths paths = session.names(LocalObjectPath(nameSpaceOf(path.handle()), owner));
+    const Paths paths = session.names(owner);
     if (!paths.empty() && !file.isStored()) {
         storeTable(paths.front());
     }
@@ -127,25 +133,40 @@ void Transaction::requireTable() const {
 
 /** Stores records that are only in memory, since their file was removed, by setting a value to itself. */
 void Transaction::storeTable(const CMPIObjectPath* record) const {
-    const LocalObjectPath changed = localPath(record, owner);
+    const LocalObject changed = localPath(record, owner);
     const auto* number = std::find_if(owner.begin(), owner.end(), [](const Property& property) {
         return property.isWritable && property.type == CMPI_uint32;
     });
-    session.modify(changed, {{number, propertyOf(session.get(changed, owner), *number).value()}});
+    const std::string current = propertyOf(session.get(changed, owner), *number).value();
+    session.modify(changed, LocalObject({}, owner, {{number, current}}));
     file.commit({}, true);
 }
 
+/** Fails if there is a record with the identifier. Asks the provider only if the file may have one. */
+void Transaction::requireNew(const std::string& identifier, const std::string& content) const {
+    if (file.mayHave(content, identifier) && session.find(path, owner) != nullptr) {
+        fail(CMPI_RC_ERR_ALREADY_EXISTS, std::string(owner.name) + " " + identifier + " already exists.");
+    }
+}
+
+/** An existing record; null if there is none. Lists the names only if the file has lost the first record's identifier.
+ */
+const CMPIInstance* Transaction::anyRecord(const std::string& content) const {
+    const std::string identifier = DataFile::firstIdentifier(content);
+    const LocalObject first(nameSpaceOf(path.path()), owner, {{cim::findNamed(owner, identifierKey), identifier}});
+    const CMPIInstance* record = session.find(first, owner);
+    const Paths others = record == nullptr ? session.names(owner) : Paths();
+    return others.empty() ? record : session.get(localPath(others.front(), owner), owner);
+}
+
 /** Refuses other read-only values than an existing record has, since all records have the same. */
-void Transaction::requireReadOnlyValues(const Values& given) const {
+void Transaction::requireReadOnlyValues(const Values& given, const std::string& content) const {
     Values readOnly;
     std::copy_if(given.begin(), given.end(), std::back_inserter(readOnly),
                  [](const auto& value) { return !value.first->isWritable; });
-    if (readOnly.empty()) {
-        return;
-    }
-    const ProviderSession::Paths paths = session.names(LocalObjectPath(nameSpaceOf(path.handle()), owner));
-    if (!paths.empty()) {
-        diff(session.get(localPath(paths.front(), owner), owner), readOnly, false);
+    const CMPIInstance* record = readOnly.empty() ? nullptr : anyRecord(content);
+    if (record != nullptr) {
+        diff(record, readOnly, false);
     }
 }
 

@@ -21,10 +21,10 @@ namespace gate {
 class Transaction {
 public:
     Transaction(ProviderSession& itsSession, const Class& itsClass, const DataFile& itsFile,
-                const LocalObjectPath& itsPath);
+                const LocalObject& itsPath);
 
     /**
-     * Creates a record with these values.
+     * Creates a record with these values. Fails with CMPI_RC_ERR_ALREADY_EXISTS if there is one with the identifier.
      * @param returnPath returns the record's path to the client; if it throws, the creation is rolled back
      */
     void create(const std::string& identifier, const Values& given, const std::function<void()>& returnPath);
@@ -36,19 +36,22 @@ public:
     void remove();
 
 private:
+    FileState open(std::size_t growth) const;
     template <class Change>
-    void run(std::size_t growth, bool hasSteps, Change change) const;
+    void run(FileState before, bool hasSteps, Change change) const;
     std::string rollBack(const FileState& before) const;
 
     void apply(const CMPIInstance* current, const Values& changes) const;
     void requireTable() const;
     void storeTable(const CMPIObjectPath* record) const;
-    void requireReadOnlyValues(const Values& given) const;
+    void requireNew(const std::string& identifier, const std::string& content) const;
+    const CMPIInstance* anyRecord(const std::string& content) const;
+    void requireReadOnlyValues(const Values& given, const std::string& content) const;
 
     ProviderSession& session;
     const Class& owner;
     const DataFile& file;
-    const LocalObjectPath& path;
+    const LocalObject& path;
 };
 
 }  // namespace gate

@@ -315,9 +315,9 @@ TEST(LockClosingTest, AForkedChildDoesNotWait) {
 }
 
 TEST(LockClosingTest, ARequestWithoutItsManagerGetsNoSessionAndReleasesTheLock) {
-    const gate::Request late{nullptr, nullptr, nullptr, gate::theRequestLock.generation() + 1};
+    const gate::ClientRequest late{nullptr, nullptr, nullptr, gate::theRequestLock.generation() + 1};
     EXPECT_THROW(gate::ProviderSession{late}, gate::ManagerGone);
-    const gate::Request inTime{nullptr, nullptr, nullptr, gate::theRequestLock.generation()};
+    const gate::ClientRequest inTime{nullptr, nullptr, nullptr, gate::theRequestLock.generation()};
     EXPECT_THROW(gate::ProviderSession{inTime}, gate::ManagerGone) << "there is no manager";
     const gate::LockGuard next;
     EXPECT_EQ(gate::theRequestLock.waiting(), 0U) << "both sessions released the lock";
