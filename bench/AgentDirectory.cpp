@@ -1,11 +1,11 @@
 #include "AgentDirectory.h"
 
-#include "Rows.h"
-
 #include <cstdlib>
 #include <fstream>
 #include <stdexcept>
 #include <string>
+
+#include "Rows.h"
 
 namespace bench {
 

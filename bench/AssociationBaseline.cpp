@@ -1,8 +1,8 @@
-#include "Baseline.h"
-#include "BaselineCalls.h"
-
 #include <algorithm>
 #include <utility>
+
+#include "Baseline.h"
+#include "BaselineCalls.h"
 
 namespace bench {
 

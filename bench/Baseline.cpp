@@ -1,11 +1,11 @@
 #include "Baseline.h"
 
-#include "BaselineCalls.h"
-#include "RecordFile.h"
-
 #include <algorithm>
 #include <type_traits>
 #include <utility>
+
+#include "BaselineCalls.h"
+#include "RecordFile.h"
 
 namespace bench {
 

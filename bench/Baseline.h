@@ -1,13 +1,13 @@
 #pragma once
 
-#include "Requests.h"
-#include "Rows.h"
-
 #include <cmpift.h>
 
 #include <filesystem>
 #include <memory>
 #include <vector>
+
+#include "Requests.h"
+#include "Rows.h"
 
 /**
  * The baseline is a loop over plain structs that has the same function tables, makes the same broker calls and returns

@@ -1,10 +1,10 @@
 #pragma once
 
-#include "Rows.h"
-
 #include <cmpift.h>
 
 #include <string>
+
+#include "Rows.h"
 
 /** The broker calls of a response, without checks. */
 namespace bench {

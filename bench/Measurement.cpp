@@ -1,6 +1,3 @@
-#include "Cases.h"
-#include "ProcessResources.h"
-
 #include <benchmark/benchmark.h>
 #include <malloc.h>
 
@@ -14,6 +11,9 @@
 #include <stdexcept>
 #include <utility>
 #include <vector>
+
+#include "Cases.h"
+#include "ProcessResources.h"
 
 namespace bench {
 

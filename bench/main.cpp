@@ -1,11 +1,11 @@
-#include "Cases.h"
-
 #include <benchmark/benchmark.h>
 #include <malloc.h>
 
 #include <exception>
 #include <iostream>
 #include <limits>
+
+#include "Cases.h"
 
 namespace {
 

@@ -1,15 +1,14 @@
 // Sends many requests to the provider, and fails if the process's resources grow. Set the environment variable
 // GLIBC_TUNABLES=glibc.malloc.tcache_count=0 for exact figures: the C library counts its caches as in use.
 
-#include "Soak.h"
-
 #include <CLI/CLI.hpp>
-
 #include <cstdio>
 #include <exception>
 #include <iostream>
 #include <string>
 #include <vector>
+
+#include "Soak.h"
 
 namespace {
 

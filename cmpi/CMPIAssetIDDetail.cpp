@@ -1,8 +1,8 @@
 #include "CMPIAssetIDDetail.h"
 
-#include "ProductAdapterImpl.h"
-
 #include <vector>
+
+#include "ProductAdapterImpl.h"
 
 namespace KO::LeaseWarrantyProvider {
 

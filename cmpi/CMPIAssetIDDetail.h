@@ -1,11 +1,11 @@
 #pragma once
 
+#include <array>
+
 #include "AssetIDDetails.h"
 #include "ProductAdapter.h"
 #include "PropertyTable.h"
 #include "Trace.h"
-
-#include <array>
 
 namespace KO::LeaseWarrantyProvider {
 

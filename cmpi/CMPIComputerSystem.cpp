@@ -1,12 +1,12 @@
 #include "CMPIComputerSystem.h"
 
-#include "KO/Exceptions.h"
-#include "Trace.h"
-#include "cim/CmpiAccess.h"
-
 #include <cmpift.h>
 
 #include <utility>
+
+#include "KO/Exceptions.h"
+#include "Trace.h"
+#include "cim/CmpiAccess.h"
 
 namespace KO::LeaseWarrantyProvider {
 

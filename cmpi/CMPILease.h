@@ -1,10 +1,10 @@
 #pragma once
 
+#include <array>
+
 #include "Lease.h"
 #include "PropertyTable.h"
 #include "RecordAdapter.h"
-
-#include <array>
 
 namespace KO::LeaseWarrantyProvider {
 

@@ -1,10 +1,10 @@
 #pragma once
 
+#include <array>
+
 #include "PropertyTable.h"
 #include "RecordAdapter.h"
 #include "Warranty.h"
-
-#include <array>
 
 namespace KO::LeaseWarrantyProvider {
 

@@ -2,12 +2,12 @@
 
 // Definitions of ElementAdapter. Include only in RecordAdapterImpl.h and ProductAdapterImpl.h.
 
+#include <utility>
+
 #include "ElementAdapter.h"
 #include "KO/ProviderUtilities.h"
 #include "PropertyTable.h"
 #include "Trace.h"
-
-#include <utility>
 
 namespace KO::LeaseWarrantyProvider {
 

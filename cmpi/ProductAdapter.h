@@ -1,11 +1,11 @@
 #pragma once
 
-#include "ElementAdapter.h"
-#include "PropertyTable.h"
-
 #include <cmpidt.h>
 
 #include <string>
+
+#include "ElementAdapter.h"
+#include "PropertyTable.h"
 
 namespace KO::LeaseWarrantyProvider {
 

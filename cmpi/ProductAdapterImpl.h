@@ -3,13 +3,13 @@
 // Definitions of ProductAdapter. Included only by the source file of each adapter, so that its code and trace buffers
 // belong to that translation unit.
 
+#include <string>
+
 #include "ElementAdapterImpl.h"
 #include "KO/ProviderUtilities.h"
 #include "ProductAdapter.h"
 #include "PropertyTable.h"
 #include "Trace.h"
-
-#include <string>
 
 namespace KO::LeaseWarrantyProvider {
 

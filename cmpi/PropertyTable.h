@@ -1,9 +1,9 @@
 #pragma once
 
-#include "KO/ProviderUtilities.h"
-
 #include <string>
 #include <type_traits>
+
+#include "KO/ProviderUtilities.h"
 
 namespace KO::LeaseWarrantyProvider {
 

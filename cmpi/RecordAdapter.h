@@ -1,8 +1,8 @@
 #pragma once
 
-#include "ElementAdapter.h"
-
 #include <cmpidt.h>
+
+#include "ElementAdapter.h"
 
 namespace KO::LeaseWarrantyProvider {
 

@@ -3,6 +3,11 @@
 // Definitions of RecordAdapter. Included only by the source file of each adapter, so that its code and trace buffers
 // belong to that translation unit.
 
+#include <cmpift.h>
+
+#include <optional>
+#include <string>
+
 #include "ElementAdapterImpl.h"
 #include "KO/Instrumentation.h"
 #include "KO/ProviderUtilities.h"
@@ -10,11 +15,6 @@
 #include "RecordAdapter.h"
 #include "Trace.h"
 #include "cim/CmpiAccess.h"
-
-#include <cmpift.h>
-
-#include <optional>
-#include <string>
 
 namespace KO::LeaseWarrantyProvider {
 

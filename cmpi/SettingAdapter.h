@@ -1,10 +1,10 @@
 #pragma once
 
-#include "CMPIComputerSystem.h"
-
 #include <cmpidt.h>
 
 #include <string>
+
+#include "CMPIComputerSystem.h"
 
 namespace KO::LeaseWarrantyProvider {
 

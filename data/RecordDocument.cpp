@@ -1,17 +1,17 @@
 #include "RecordDocument.h"
 
-#include "LeaseBase.h"
-#include "RecordStream.h"
-#include "WarrantyBase.h"
-#include "cim/DateTime.h"
-#include "cim/Utf8.h"
-
 #include <algorithm>
 #include <cstdint>
 #include <limits>
 #include <set>
 #include <sstream>
 #include <variant>
+
+#include "LeaseBase.h"
+#include "RecordStream.h"
+#include "WarrantyBase.h"
+#include "cim/DateTime.h"
+#include "cim/Utf8.h"
 
 namespace KO::LeaseWarrantyProvider {
 

@@ -1,9 +1,8 @@
 #pragma once
 
-#include <nlohmann/json.hpp>
-
 #include <array>
 #include <cstddef>
+#include <nlohmann/json.hpp>
 #include <stdexcept>
 #include <string>
 

@@ -1,7 +1,6 @@
 // lease-warranty-data: checks, restores, exports and imports the record files.
 
 #include <CLI/CLI.hpp>
-
 #include <cerrno>
 #include <cstdio>
 #include <cstring>

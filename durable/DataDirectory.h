@@ -1,13 +1,13 @@
 #pragma once
 
-#include "DirectoryLock.h"
-#include "RecordFile.h"
-
 #include <sys/types.h>
 #include <unistd.h>
 
 #include <array>
 #include <string>
+
+#include "DirectoryLock.h"
+#include "RecordFile.h"
 
 namespace durable {
 

@@ -1,7 +1,5 @@
 #include "DirectoryLock.h"
 
-#include "Files.h"
-
 #include <fcntl.h>
 #include <sys/stat.h>
 #include <unistd.h>
@@ -9,6 +7,8 @@
 #include <algorithm>
 #include <cerrno>
 #include <system_error>
+
+#include "Files.h"
 
 namespace durable {
 

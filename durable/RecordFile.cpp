@@ -1,7 +1,5 @@
 #include "RecordFile.h"
 
-#include "Files.h"
-
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -14,6 +12,8 @@
 #include <iterator>
 #include <stdexcept>
 #include <system_error>
+
+#include "Files.h"
 
 namespace durable {
 

@@ -1,12 +1,12 @@
 #pragma once
 
-#include "SavedCopies.h"
-
 #include <cstddef>
 #include <optional>
 #include <string>
 #include <string_view>
 #include <vector>
+
+#include "SavedCopies.h"
 
 namespace durable {
 

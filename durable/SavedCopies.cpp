@@ -1,7 +1,5 @@
 #include "SavedCopies.h"
 
-#include "Files.h"
-
 #include <unistd.h>
 
 #include <algorithm>
@@ -9,6 +7,8 @@
 #include <charconv>
 #include <exception>
 #include <utility>
+
+#include "Files.h"
 
 namespace durable {
 

@@ -1,8 +1,8 @@
 #pragma once
 
-#include "AssetIDDetails.h"
-
 #include <array>
+
+#include "AssetIDDetails.h"
 
 /** The asset data file: its name, its lock, and the keys that are read and written. */
 namespace KO::LeaseWarrantyProvider {

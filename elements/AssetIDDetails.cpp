@@ -1,5 +1,12 @@
 #include "AssetIDDetails.h"
 
+#include <algorithm>
+#include <array>
+#include <ctime>
+#include <optional>
+#include <type_traits>
+#include <variant>
+
 #include "AssetFile.h"
 #include "KO/File.h"
 #include "KO/PlatformUtilities.h"
@@ -8,13 +15,6 @@
 #include "KO/Strings.h"
 #include "KO/Utils.h"
 #include "Trace.h"
-
-#include <algorithm>
-#include <array>
-#include <ctime>
-#include <optional>
-#include <type_traits>
-#include <variant>
 
 namespace KO {
 

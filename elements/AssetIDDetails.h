@@ -1,12 +1,12 @@
 #pragma once
 
-#include "KO/DateTime.h"
-#include "KO/Instrumentation.h"
-#include "KO/Mutex.h"
-
 #include <string>
 #include <utility>
 #include <vector>
+
+#include "KO/DateTime.h"
+#include "KO/Instrumentation.h"
+#include "KO/Mutex.h"
 
 namespace KO {
 

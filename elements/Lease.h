@@ -1,9 +1,9 @@
 #pragma once
 
+#include <string>
+
 #include "LeaseBase.h"
 #include "RecordElement.h"
-
-#include <string>
 
 namespace KO::LeaseWarrantyProvider {
 

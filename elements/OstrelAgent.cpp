@@ -1,14 +1,14 @@
 #include "OstrelAgent.h"
 
+#include <algorithm>
+#include <array>
+
 #include "KO/Exceptions.h"
 #include "KO/File.h"
 #include "KO/PlatformUtilities.h"
 #include "KO/Product.h"
 #include "KO/Strings.h"
 #include "Trace.h"
-
-#include <algorithm>
-#include <array>
 
 namespace KO::LeaseWarrantyProvider {
 

@@ -1,10 +1,10 @@
 #pragma once
 
-#include "FixedString.h"
-#include "Trace.h"
-
 #include <string>
 #include <vector>
+
+#include "FixedString.h"
+#include "Trace.h"
 
 namespace KO::LeaseWarrantyProvider {
 

@@ -3,10 +3,10 @@
 // Definitions of RecordElement. Included only by the source file of each element, so that its code and trace buffers
 // belong to that translation unit.
 
+#include <algorithm>
+
 #include "KO/Exceptions.h"
 #include "RecordElement.h"
-
-#include <algorithm>
 
 namespace KO::LeaseWarrantyProvider {
 

@@ -3,12 +3,12 @@
 // Definitions of SettingElement. Included only by the source file of each setting element, so that its code and trace
 // buffers belong to that translation unit.
 
-#include "KO/Exceptions.h"
-#include "SettingElement.h"
-
 #include <exception>
 #include <new>
 #include <string>
+
+#include "KO/Exceptions.h"
+#include "SettingElement.h"
 
 namespace KO::LeaseWarrantyProvider {
 

@@ -1,9 +1,9 @@
 #pragma once
 
+#include <string>
+
 #include "RecordElement.h"
 #include "WarrantyBase.h"
-
-#include <string>
 
 namespace KO::LeaseWarrantyProvider {
 

@@ -1,10 +1,9 @@
-#include "Target.h"
-
-#include "framework/AgentState.h"
-#include "logging/LogSettings.h"
-
 #include <limits>
 #include <string>
+
+#include "Target.h"
+#include "framework/AgentState.h"
+#include "logging/LogSettings.h"
 
 // The agent's configuration file: parsing does not throw, and all settings, configured or default, are in their ranges.
 

@@ -1,12 +1,12 @@
 #include "Calls.h"
 
-#include "schema/MofWriter.h"
-#include "schema/ObjectPathText.h"
-#include "support/Values.h"
-
 #include <array>
 #include <string>
 #include <vector>
+
+#include "schema/MofWriter.h"
+#include "schema/ObjectPathText.h"
+#include "support/Values.h"
 
 namespace fuzz {
 

@@ -1,5 +1,7 @@
-#include "Target.h"
+#include <map>
+#include <string>
 
+#include "Target.h"
 #include "cim/Names.h"
 #include "cimxml/ElementReader.h"
 #include "cimxml/Errors.h"
@@ -7,9 +9,6 @@
 #include "schema/MofReader.h"
 #include "schema/MofWriter.h"
 #include "schema/ObjectPathText.h"
-
-#include <map>
-#include <string>
 
 // A request body in CIM-XML: it is refused, or the response is well-formed XML and agrees with a model of the
 // instances, which read the same once written.

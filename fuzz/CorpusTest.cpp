@@ -1,11 +1,10 @@
-#include "Target.h"
-
 #include <gtest/gtest.h>
 
 #include <algorithm>
 #include <filesystem>
 #include <vector>
 
+#include "Target.h"
 #include "support/Files.h"
 
 // Runs a fuzzer with the inputs of its corpus, without the fuzzing engine.

@@ -1,10 +1,3 @@
-#include "MemoryFile.h"
-#include "Target.h"
-
-#include "KO/NodeLexicon.h"
-#include "cim/Utf8.h"
-#include "framework/ComputerDiscovery.h"
-
 #include <algorithm>
 #include <array>
 #include <cstdlib>
@@ -12,6 +5,12 @@
 #include <string>
 #include <string_view>
 #include <vector>
+
+#include "KO/NodeLexicon.h"
+#include "MemoryFile.h"
+#include "Target.h"
+#include "cim/Utf8.h"
+#include "framework/ComputerDiscovery.h"
 
 // Strings of the firmware: any of them results in nodes with readable names. Readable names are not changed.
 

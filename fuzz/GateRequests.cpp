@@ -1,6 +1,10 @@
+#include <algorithm>
+#include <iterator>
+#include <map>
+#include <string>
+
 #include "ProviderModel.h"
 #include "Target.h"
-
 #include "cim/DateTime.h"
 #include "cim/Names.h"
 #include "framework/PropertyText.h"
@@ -8,11 +12,6 @@
 #include "schema/MofWriter.h"
 #include "support/AssetModel.h"
 #include "support/Values.h"
-
-#include <algorithm>
-#include <iterator>
-#include <map>
-#include <string>
 
 // Sequences of calls of the gate's function tables: a call that returns OK has the effect that CIM defines, and
 // survives a restart; any other call has a message and changes nothing.

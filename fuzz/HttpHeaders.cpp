@@ -1,11 +1,10 @@
-#include "Target.h"
+#include <sstream>
+#include <string>
 
+#include "Target.h"
 #include "cim/Names.h"
 #include "server/Authentication.h"
 #include "server/HeaderCheck.h"
-
-#include <sstream>
-#include <string>
 
 // The head of an HTTP request, a line for the method and one for each header: what is accepted has all that it must
 // have, and what is refused has a status.

@@ -1,6 +1,5 @@
-#include "gate/session/ProviderLibrary.h"
-
 #include "SystemUnderTest.h"
+#include "gate/session/ProviderLibrary.h"
 
 // Gives the gate a provider that is linked into the fuzzer: loading it only destroys and reads its tables.
 

@@ -1,14 +1,13 @@
-#include "Target.h"
-
-#include "model/Value.h"
-#include "schema/Errors.h"
-#include "schema/MofReader.h"
-#include "schema/MofWriter.h"
-
 #include <algorithm>
 #include <cctype>
 #include <string>
 #include <string_view>
+
+#include "Target.h"
+#include "model/Value.h"
+#include "schema/Errors.h"
+#include "schema/MofReader.h"
+#include "schema/MofWriter.h"
 
 // MOF: an input is rejected with a LoadError, or its classes are consistent and its values are read as they are
 // written.

@@ -1,12 +1,10 @@
-#include "schema/ObjectPathText.h"
+#include <string>
 
 #include "Target.h"
-
 #include "cim/Names.h"
 #include "schema/Errors.h"
 #include "schema/MofReader.h"
-
-#include <string>
+#include "schema/ObjectPathText.h"
 
 // Object paths: an input is rejected with a PathError, or its path is read as it is written.
 

@@ -1,13 +1,12 @@
-#include "Target.h"
-
-#include "KO/Utils.h"
-#include "cim/DateTime.h"
-#include "framework/PropertyText.h"
-
 #include <string>
 #include <string_view>
 #include <utility>
 #include <vector>
+
+#include "KO/Utils.h"
+#include "Target.h"
+#include "cim/DateTime.h"
+#include "framework/PropertyText.h"
 
 // Property files: setting a value in any file changes only its line.
 

@@ -1,13 +1,12 @@
 #include "ProviderModel.h"
 
-#include "Target.h"
+#include <algorithm>
+#include <limits>
 
+#include "Target.h"
 #include "cim/Names.h"
 #include "framework/PropertyText.h"
 #include "support/AssetModel.h"
-
-#include <algorithm>
-#include <limits>
 
 namespace fuzz {
 

@@ -1,11 +1,11 @@
 #pragma once
 
-#include "SystemUnderTest.h"
-
 #include <map>
 #include <optional>
 #include <string>
 #include <vector>
+
+#include "SystemUnderTest.h"
 
 // A model of the provider: the response to each call, and the stored data after it.
 

@@ -1,7 +1,9 @@
-#include "ProviderModel.h"
-#include "Target.h"
+#include <algorithm>
+#include <string>
 
 #include "LeaseAndWarrantyProvider.h"
+#include "ProviderModel.h"
+#include "Target.h"
 #include "Trace.h"
 #include "cim/Names.h"
 #include "model/Request.h"
@@ -9,9 +11,6 @@
 #include "schema/MofWriter.h"
 #include "support/AssetModel.h"
 #include "support/Values.h"
-
-#include <algorithm>
-#include <string>
 
 // Sequences of calls of the provider's function tables: responses, tables and files are those of a model of the
 // provider. Associations and the agent's identity change nothing. With and without tracing, in which the provider finds

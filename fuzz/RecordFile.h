@@ -1,16 +1,15 @@
 #pragma once
 
-#include "MemoryFile.h"
-#include "Target.h"
-
-#include "RecordTable.h"
-#include "support/RecordModel.h"
-
 #include <new>
 #include <string>
 #include <string_view>
 #include <variant>
 #include <vector>
+
+#include "MemoryFile.h"
+#include "RecordTable.h"
+#include "Target.h"
+#include "support/RecordModel.h"
 
 // Shared by the fuzzers of the two record files.
 

@@ -1,14 +1,13 @@
 #include "schema/Registration.h"
 
-#include "Target.h"
-
-#include "cim/Names.h"
-#include "schema/Errors.h"
-
 #include <algorithm>
 #include <sstream>
 #include <string>
 #include <vector>
+
+#include "Target.h"
+#include "cim/Names.h"
+#include "schema/Errors.h"
 
 // Registration files: an input is rejected with a LoadError, or its registrations are read as they are written.
 

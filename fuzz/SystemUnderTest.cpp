@@ -1,5 +1,9 @@
 #include "SystemUnderTest.h"
 
+#include <fstream>
+#include <iterator>
+#include <memory>
+
 #include "LeaseBase.h"
 #include "RecordFile.h"
 #include "WarrantyBase.h"
@@ -8,10 +12,6 @@
 #include "support/AgentEnvironment.h"
 #include "support/Files.h"
 #include "support/Values.h"
-
-#include <fstream>
-#include <iterator>
-#include <memory>
 
 namespace fuzz {
 

@@ -1,16 +1,15 @@
 #pragma once
 
-#include "Calls.h"
-
-#include "operations/RequestRunner.h"
-#include "support/RecordModel.h"
-
 #include <cmpift.h>
 
 #include <filesystem>
 #include <optional>
 #include <string>
 #include <vector>
+
+#include "Calls.h"
+#include "operations/RequestRunner.h"
+#include "support/RecordModel.h"
 
 namespace fuzz {
 

@@ -1,9 +1,9 @@
-#include "gate/operations/Operations.h"
-#include "gate/session/ProviderConnection.h"
-
 #include <cxxabi.h>
 
 #include <exception>
+
+#include "gate/operations/Operations.h"
+#include "gate/session/ProviderConnection.h"
 
 // The exported factories and the function tables of the two interfaces.
 

@@ -1,13 +1,13 @@
 #pragma once
 
-#include "RZLog/RZLogger.h"
-#include "RZLog/RZMessageBuffer.h"
-#include "TraceFormat.h"
-
 #include <exception>
 #include <string>
 #include <tuple>
 #include <utility>
+
+#include "RZLog/RZLogger.h"
+#include "RZLog/RZMessageBuffer.h"
+#include "TraceFormat.h"
 
 /**
  * Tracing of the provider's functions. Never throws: a line that cannot be written is dropped.

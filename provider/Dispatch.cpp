@@ -1,5 +1,8 @@
 #include "Dispatch.h"
 
+#include <algorithm>
+#include <array>
+
 #include "CMPIAssetIDDetail.h"
 #include "CMPILease.h"
 #include "CMPILeaseSetting.h"
@@ -8,9 +11,6 @@
 #include "CMPIWarrantySetting.h"
 #include "Handlers.h"
 #include "KO/ClassIds.h"
-
-#include <algorithm>
-#include <array>
 
 namespace KO::LeaseWarrantyProvider {
 

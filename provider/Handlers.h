@@ -1,9 +1,9 @@
 #pragma once
 
+#include <cmpift.h>
+
 #include "AdapterContract.h"
 #include "Dispatch.h"
-
-#include <cmpift.h>
 
 /**
  * Handlers of the operations. They pass the adapter's results to the object manager one by one and skip null pointers.

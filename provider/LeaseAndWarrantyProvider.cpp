@@ -1,11 +1,11 @@
 #include "LeaseAndWarrantyProvider.h"
 
+#include <exception>
+#include <string>
+
 #include "Dispatch.h"
 #include "KO/ProviderUtilities.h"
 #include "Trace.h"
-
-#include <exception>
-#include <string>
 
 namespace KO::LeaseWarrantyProvider {
 

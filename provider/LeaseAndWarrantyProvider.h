@@ -1,9 +1,9 @@
 #pragma once
 
-#include "Export.h"
-
 #include <cmpidt.h>
 #include <cmpift.h>
+
+#include "Export.h"
 
 /**
  * The library's two factories, which the object manager looks up by name. Each stores the broker for all later requests

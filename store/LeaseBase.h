@@ -1,10 +1,10 @@
 #pragma once
 
-#include "RecordBase.h"
-
 #include <array>
 #include <fstream>
 #include <string>
+
+#include "RecordBase.h"
 
 namespace KO::LeaseWarrantyProvider {
 

@@ -1,15 +1,15 @@
 #pragma once
 
-#include "FixedString.h"
-#include "IdentifierIndex.h"
-#include "RecordFields.h"
-#include "Trace.h"
-
 #include <cstddef>
 #include <exception>
 #include <limits>
 #include <string>
 #include <vector>
+
+#include "FixedString.h"
+#include "IdentifierIndex.h"
+#include "RecordFields.h"
+#include "Trace.h"
 
 namespace KO::LeaseWarrantyProvider {
 

@@ -3,13 +3,13 @@
 // Definitions of RecordBase, RecordCache and RecordTrace. Included only by the source file of each store, so that its
 // code and trace buffers belong to that translation unit.
 
-#include "KO/Exceptions.h"
-#include "RecordBase.h"
-#include "RecordTable.h"
-
 #include <algorithm>
 #include <exception>
 #include <new>
+
+#include "KO/Exceptions.h"
+#include "RecordBase.h"
+#include "RecordTable.h"
 
 namespace KO::LeaseWarrantyProvider {
 

@@ -1,9 +1,9 @@
 #include "RecordStream.h"
 
-#include "cim/DateTime.h"
-
 #include <algorithm>
 #include <iterator>
+
+#include "cim/DateTime.h"
 
 namespace KO::LeaseWarrantyProvider {
 

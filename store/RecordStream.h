@@ -1,10 +1,10 @@
 #pragma once
 
-#include "RecordFields.h"
-
 #include <istream>
 #include <ostream>
 #include <string>
+
+#include "RecordFields.h"
 
 namespace KO::LeaseWarrantyProvider {
 

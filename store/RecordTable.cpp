@@ -1,11 +1,11 @@
 #include "RecordTable.h"
 
-#include "KO/PlatformUtilities.h"
-#include "KO/Strings.h"
-
 #include <unistd.h>
 
 #include <new>
+
+#include "KO/PlatformUtilities.h"
+#include "KO/Strings.h"
 
 namespace KO::LeaseWarrantyProvider {
 

@@ -1,7 +1,5 @@
 #pragma once
 
-#include "RecordStream.h"
-
 #include <cstddef>
 #include <cstdio>
 #include <fstream>
@@ -9,6 +7,8 @@
 #include <new>
 #include <string>
 #include <vector>
+
+#include "RecordStream.h"
 
 namespace KO::LeaseWarrantyProvider {
 

@@ -1,13 +1,13 @@
+#include <cmpift.h>
+
+#include <atomic>
+#include <exception>
+
 #include "Computer.h"
 #include "Export.h"
 #include "KO/ClassIds.h"
 #include "KO/ProviderUtilities.h"
 #include "cim/CmpiAccess.h"
-
-#include <cmpift.h>
-
-#include <atomic>
-#include <exception>
 
 // Serves VELKO_ComputerSystem, read-only. Requests share only the broker, and may run concurrently.
 

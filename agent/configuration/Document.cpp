@@ -1,13 +1,12 @@
 #include "configuration/Document.h"
 
-#include "cim/Utf8.h"
-#include "configuration/FileContent.h"
-
-#include <toml.hpp>
-
 #include <algorithm>
 #include <cstdlib>
 #include <sstream>
+#include <toml.hpp>
+
+#include "cim/Utf8.h"
+#include "configuration/FileContent.h"
 
 namespace Agent {
 

@@ -1,12 +1,12 @@
 #pragma once
 
-#include "configuration/TableReader.h"
-
 #include <cstddef>
 #include <memory>
 #include <optional>
 #include <string>
 #include <string_view>
+
+#include "configuration/TableReader.h"
 
 namespace Agent {
 

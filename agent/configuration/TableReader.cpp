@@ -1,8 +1,7 @@
 #include "configuration/TableReader.h"
 
-#include <toml.hpp>
-
 #include <algorithm>
+#include <toml.hpp>
 
 namespace Agent {
 

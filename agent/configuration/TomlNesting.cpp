@@ -1,6 +1,6 @@
-#include "configuration/Document.h"
-
 #include <algorithm>
+
+#include "configuration/Document.h"
 
 namespace Agent {
 

@@ -1,9 +1,9 @@
-#include "framework/AgentState.h"
-
 #include <systemd/sd-id128.h>
 
 #include <charconv>
 #include <initializer_list>
+
+#include "framework/AgentState.h"
 
 namespace KO {
 

@@ -1,9 +1,9 @@
 #include "framework/AgentState.h"
 
+#include <mutex>
+
 #include "RZLog/RZLogger.h"
 #include "framework/ComputerDiscovery.h"
-
-#include <mutex>
 
 namespace KO {
 

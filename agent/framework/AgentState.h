@@ -1,12 +1,12 @@
 #pragma once
 
-#include "configuration/Document.h"
-#include "framework/NodeTree.h"
-
 #include <map>
 #include <memory>
 #include <string>
 #include <vector>
+
+#include "configuration/Document.h"
+#include "framework/NodeTree.h"
 
 namespace KO {
 

@@ -1,14 +1,14 @@
 #include "framework/ComputerDiscovery.h"
 
-#include "KO/NodeLexicon.h"
-#include "cim/Names.h"
-#include "cim/Utf8.h"
-#include "configuration/FileContent.h"
-
 #include <unistd.h>
 
 #include <algorithm>
 #include <charconv>
+
+#include "KO/NodeLexicon.h"
+#include "cim/Names.h"
+#include "cim/Utf8.h"
+#include "configuration/FileContent.h"
 
 namespace KO {
 

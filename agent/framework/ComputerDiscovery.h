@@ -1,9 +1,9 @@
 #pragma once
 
+#include <string>
+
 #include "configuration/TableReader.h"
 #include "framework/NodeTree.h"
-
-#include <string>
 
 namespace KO {
 

@@ -1,10 +1,10 @@
 #include "KO/DateTime.h"
 
-#include "KO/Utils.h"
-#include "cim/DateTime.h"
-
 #include <ctime>
 #include <utility>
+
+#include "KO/Utils.h"
+#include "cim/DateTime.h"
 
 namespace KO {
 

@@ -1,9 +1,9 @@
 #include "KO/File.h"
 
+#include <sys/stat.h>
+
 #include "KO/Strings.h"
 #include "framework/FileAccess.h"
-
-#include <sys/stat.h>
 
 namespace KO {
 

@@ -1,10 +1,5 @@
 #include "framework/FileAccess.h"
 
-#include "KO/Exceptions.h"
-#include "KO/File.h"
-#include "KO/Strings.h"
-#include "configuration/FileContent.h"
-
 #include <fcntl.h>
 #include <sys/stat.h>
 #include <unistd.h>
@@ -13,6 +8,11 @@
 #include <cstdio>
 #include <cstdlib>
 #include <filesystem>
+
+#include "KO/Exceptions.h"
+#include "KO/File.h"
+#include "KO/Strings.h"
+#include "configuration/FileContent.h"
 
 namespace KO {
 

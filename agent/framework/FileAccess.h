@@ -1,8 +1,8 @@
 #pragma once
 
-#include "configuration/FileContent.h"
-
 #include <string>
+
+#include "configuration/FileContent.h"
 
 namespace KO {
 

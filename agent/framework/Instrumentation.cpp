@@ -1,8 +1,8 @@
 #include "KO/Instrumentation.h"
 
-#include "framework/AgentState.h"
-
 #include <vector>
+
+#include "framework/AgentState.h"
 
 namespace KO {
 

@@ -1,13 +1,13 @@
 #include "KO/Mutex.h"
 
-#include "KO/Exceptions.h"
-#include "configuration/FileContent.h"
-
 #include <pthread.h>
 
 #include <cerrno>
 #include <ctime>
 #include <new>
+
+#include "KO/Exceptions.h"
+#include "configuration/FileContent.h"
 
 namespace KO {
 

@@ -1,13 +1,13 @@
 #include "KO/PropertyFile.h"
 
+#include <utility>
+
 #include "KO/Exceptions.h"
 #include "KO/Strings.h"
 #include "KO/Utils.h"
 #include "configuration/FileContent.h"
 #include "framework/FileAccess.h"
 #include "framework/PropertyText.h"
-
-#include <utility>
 
 namespace KO {
 

@@ -1,15 +1,15 @@
 #include "KO/ProviderUtilities.h"
 
+#include <algorithm>
+#include <charconv>
+#include <optional>
+#include <system_error>
+
 #include "KO/ClassIds.h"
 #include "KO/Moniker.h"
 #include "cim/CmpiAccess.h"
 #include "cim/DateTime.h"
 #include "cim/Names.h"
-
-#include <algorithm>
-#include <charconv>
-#include <optional>
-#include <system_error>
 
 namespace KO {
 

@@ -1,8 +1,8 @@
 #include "KO/Strings.h"
 
-#include "cim/Utf8.h"
-
 #include <cstdint>
+
+#include "cim/Utf8.h"
 
 namespace KO {
 

@@ -1,7 +1,3 @@
-#include "logging/Sinks.h"
-
-#include "configuration/FileContent.h"
-
 #include <fcntl.h>
 #include <sys/stat.h>
 #include <unistd.h>
@@ -10,6 +6,9 @@
 #include <cstdio>
 #include <filesystem>
 #include <system_error>
+
+#include "configuration/FileContent.h"
+#include "logging/Sinks.h"
 
 namespace RZLog {
 

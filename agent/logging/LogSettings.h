@@ -1,10 +1,10 @@
 #pragma once
 
-#include "configuration/Document.h"
-#include "logging/Levels.h"
-
 #include <cstddef>
 #include <string>
+
+#include "configuration/Document.h"
+#include "logging/Levels.h"
 
 namespace RZLog {
 

@@ -1,10 +1,10 @@
 #include "RZLog/RZLogger.h"
 
-#include "logging/Writer.h"
-
 #include <pthread.h>
 
 #include <cerrno>
+
+#include "logging/Writer.h"
 
 namespace RZLog {
 

@@ -1,9 +1,9 @@
 #include "logging/Record.h"
 
-#include "cim/Utf8.h"
-
 #include <cstdio>
 #include <ctime>
+
+#include "cim/Utf8.h"
 
 namespace RZLog {
 

@@ -1,10 +1,10 @@
 #pragma once
 
-#include "logging/Levels.h"
-
 #include <chrono>
 #include <string>
 #include <string_view>
+
+#include "logging/Levels.h"
 
 namespace RZLog {
 

@@ -1,10 +1,10 @@
 #pragma once
 
-#include "logging/LogSettings.h"
-#include "logging/Record.h"
-
 #include <memory>
 #include <string>
+
+#include "logging/LogSettings.h"
+#include "logging/Record.h"
 
 namespace RZLog {
 

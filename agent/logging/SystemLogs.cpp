@@ -1,8 +1,3 @@
-#include "logging/Sinks.h"
-
-#include "cim/Utf8.h"
-#include "configuration/FileContent.h"
-
 #include <sys/socket.h>
 #include <sys/un.h>
 #include <syslog.h>
@@ -11,6 +6,10 @@
 #include <cstdio>
 #include <ctime>
 #include <system_error>
+
+#include "cim/Utf8.h"
+#include "configuration/FileContent.h"
+#include "logging/Sinks.h"
 
 namespace RZLog {
 

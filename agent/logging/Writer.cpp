@@ -1,13 +1,13 @@
 #include "logging/Writer.h"
 
-#include "logging/LogSettings.h"
-#include "logging/Sinks.h"
-
 #include <atomic>
 #include <chrono>
 #include <limits>
 #include <mutex>
 #include <type_traits>
+
+#include "logging/LogSettings.h"
+#include "logging/Sinks.h"
 
 namespace RZLog {
 

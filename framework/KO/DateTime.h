@@ -1,8 +1,8 @@
 #pragma once
 
-#include "Export.h"
-
 #include <memory>
+
+#include "Export.h"
 
 namespace KO {
 

@@ -1,9 +1,9 @@
 #pragma once
 
-#include "Export.h"
-
 #include <memory>
 #include <string>
+
+#include "Export.h"
 
 namespace KO {
 

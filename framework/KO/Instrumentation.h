@@ -1,10 +1,10 @@
 #pragma once
 
-#include "Export.h"
-#include "KO/NodeLexicon.h"
-
 #include <memory>
 #include <string>
+
+#include "Export.h"
+#include "KO/NodeLexicon.h"
 
 namespace KO {
 

@@ -1,9 +1,9 @@
 #pragma once
 
+#include <memory>
+
 #include "Export.h"
 #include "KO/File.h"
-
-#include <memory>
 
 namespace KO {
 

@@ -1,10 +1,10 @@
 #pragma once
 
-#include "Export.h"
-
 #include <cmpidt.h>
 
 #include <string>
+
+#include "Export.h"
 
 namespace KO {
 

@@ -1,9 +1,9 @@
 #pragma once
 
+#include <string>
+
 #include "Export.h"
 #include "KO/DateTime.h"
-
-#include <string>
 
 namespace KO {
 

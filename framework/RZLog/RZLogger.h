@@ -1,8 +1,8 @@
 #pragma once
 
-#include "Export.h"
-
 #include <string>
+
+#include "Export.h"
 
 namespace RZLog {
 

@@ -1,11 +1,11 @@
 #pragma once
 
-#include "Export.h"
-
 #include <memory>
 #include <ostream>
 #include <string>
 #include <type_traits>
+
+#include "Export.h"
 
 namespace RZLog {
 

@@ -1,9 +1,9 @@
 #pragma once
 
-#include "Objects.h"
-
 #include <deque>
 #include <string>
+
+#include "Objects.h"
 
 namespace gate {
 

@@ -1,15 +1,15 @@
 #pragma once
 
-#include "Failure.h"
-#include "Schema.h"
-#include "cim/CmpiAccess.h"
-
 #include <cmpift.h>
 
 #include <optional>
 #include <string>
 #include <utility>
 #include <vector>
+
+#include "Failure.h"
+#include "Schema.h"
+#include "cim/CmpiAccess.h"
 
 // Calls of the object manager's functions, and of its paths and instances, which it frees when the request ends.
 

@@ -1,8 +1,8 @@
 #pragma once
 
-#include "Failure.h"
-
 #include <vector>
+
+#include "Failure.h"
 
 namespace gate {
 

@@ -1,11 +1,11 @@
 #pragma once
 
-#include "cim/Names.h"
-
 #include <cmpidt.h>
 
 #include <cstddef>
 #include <string_view>
+
+#include "cim/Names.h"
 
 namespace gate {
 

@@ -1,6 +1,6 @@
-#include "Operations.h"
-
 #include <algorithm>
+
+#include "Operations.h"
 
 // All association requests return the same facts: the object manager knows the computers, and the provider knows which
 // lease or warranty belongs to each.

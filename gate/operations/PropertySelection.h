@@ -1,8 +1,8 @@
 #pragma once
 
-#include "gate/session/ProviderSession.h"
-
 #include <vector>
+
+#include "gate/session/ProviderSession.h"
 
 namespace gate {
 

@@ -1,15 +1,14 @@
 #include "ProviderConnection.h"
 
-#include "durable/DataDirectory.h"
-
-#include "KO/PlatformUtilities.h"
-
 #include <cxxabi.h>
 #include <dlfcn.h>
 
 #include <chrono>
 #include <exception>
 #include <thread>
+
+#include "KO/PlatformUtilities.h"
+#include "durable/DataDirectory.h"
 
 namespace gate {
 

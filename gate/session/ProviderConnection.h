@@ -1,13 +1,13 @@
 #pragma once
 
+#include <cstddef>
+#include <mutex>
+#include <optional>
+
 #include "ProviderLibrary.h"
 #include "RequestLock.h"
 #include "gate/cmpi/Schema.h"
 #include "gate/cmpi/WrappedBroker.h"
-
-#include <cstddef>
-#include <mutex>
-#include <optional>
 
 namespace gate {
 

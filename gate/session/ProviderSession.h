@@ -1,11 +1,11 @@
 #pragma once
 
+#include <cstddef>
+#include <vector>
+
 #include "ProviderConnection.h"
 #include "gate/cmpi/LocalObject.h"
 #include "gate/cmpi/ResultCollector.h"
-
-#include <cstddef>
-#include <vector>
 
 namespace gate {
 

@@ -1,7 +1,5 @@
 #pragma once
 
-#include "gate/cmpi/Failure.h"
-
 #include <pthread.h>
 #include <sys/types.h>
 
@@ -11,6 +9,8 @@
 #include <cstddef>
 #include <functional>
 #include <mutex>
+
+#include "gate/cmpi/Failure.h"
 
 namespace gate {
 

@@ -1,10 +1,5 @@
 #include "DataFile.h"
 
-#include "durable/Files.h"
-#include "durable/RecordFile.h"
-
-#include "KO/PlatformUtilities.h"
-
 #include <fcntl.h>
 #include <sys/stat.h>
 #include <sys/statvfs.h>
@@ -17,6 +12,10 @@
 #include <iterator>
 #include <sstream>
 #include <system_error>
+
+#include "KO/PlatformUtilities.h"
+#include "durable/Files.h"
+#include "durable/RecordFile.h"
 
 namespace gate {
 

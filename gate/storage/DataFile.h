@@ -1,10 +1,10 @@
 #pragma once
 
-#include "gate/cmpi/Objects.h"
-
 #include <cstddef>
 #include <cstdint>
 #include <string>
+
+#include "gate/cmpi/Objects.h"
 
 namespace gate {
 

@@ -1,9 +1,9 @@
 #include "Differences.h"
 
-#include "cim/DateTime.h"
-
 #include <algorithm>
 #include <string_view>
+
+#include "cim/DateTime.h"
 
 namespace gate {
 

@@ -1,11 +1,10 @@
 #include "RoundTrip.h"
 
-#include "cim/DateTime.h"
-
-#include "KO/Settings.h"
-
 #include <algorithm>
 #include <string_view>
+
+#include "KO/Settings.h"
+#include "cim/DateTime.h"
 
 namespace gate {
 

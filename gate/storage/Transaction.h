@@ -1,11 +1,11 @@
 #pragma once
 
-#include "Differences.h"
-#include "gate/session/ProviderSession.h"
-
 #include <cstddef>
 #include <functional>
 #include <string>
+
+#include "Differences.h"
+#include "gate/session/ProviderSession.h"
 
 namespace gate {
 

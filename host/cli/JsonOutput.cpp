@@ -1,8 +1,7 @@
-#include "cli/Output.h"
-
 #include <nlohmann/json.hpp>
 
 #include "cim/Utf8.h"
+#include "cli/Output.h"
 #include "operations/StatusText.h"
 #include "schema/ObjectPathText.h"
 

@@ -3,7 +3,6 @@
 #include <tao/pegtl.hpp>
 #include <tao/pegtl/contrib/parse_tree.hpp>
 #include <tao/pegtl/must_if.hpp>
-
 #include <vector>
 
 #include "schema/Literal.h"

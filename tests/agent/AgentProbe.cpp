@@ -1,12 +1,6 @@
 // A process that uses the agent's libraries with the configuration of its environment and prints their results. The
 // first argument is the action.
 
-#include "KO/Instrumentation.h"
-#include "KO/PlatformUtilities.h"
-#include "KO/Product.h"
-#include "KO/Strings.h"
-#include "RZLog/RZLogger.h"
-
 #include <pthread.h>
 #include <sys/resource.h>
 
@@ -18,6 +12,12 @@
 #include <string>
 #include <thread>
 #include <vector>
+
+#include "KO/Instrumentation.h"
+#include "KO/PlatformUtilities.h"
+#include "KO/Product.h"
+#include "KO/Strings.h"
+#include "RZLog/RZLogger.h"
 
 namespace {
 

@@ -1,9 +1,8 @@
-#include "framework/AgentState.h"
+#include <gmock/gmock.h>
 
 #include "agent/ShippedConfiguration.h"
 #include "configuration/FileContent.h"
-
-#include <gmock/gmock.h>
+#include "framework/AgentState.h"
 
 using KO::AgentSettings;
 using testing::ElementsAre;

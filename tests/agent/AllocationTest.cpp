@@ -1,10 +1,10 @@
-#include "RZLog/RZLogger.h"
-#include "RZLog/RZMessageBuffer.h"
-
 #include <gtest/gtest.h>
 
 #include <cstdlib>
 #include <new>
+
+#include "RZLog/RZLogger.h"
+#include "RZLog/RZMessageBuffer.h"
 
 namespace {
 

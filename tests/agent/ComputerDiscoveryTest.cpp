@@ -1,10 +1,9 @@
-#include "framework/ComputerDiscovery.h"
-
-#include "agent/TemporaryDirectory.h"
-
 #include <gmock/gmock.h>
 
 #include <filesystem>
+
+#include "agent/TemporaryDirectory.h"
+#include "framework/ComputerDiscovery.h"
 
 using KO::Node;
 using KO::NodeTree;

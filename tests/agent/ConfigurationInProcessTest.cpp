@@ -1,10 +1,10 @@
-#include "agent/Probe.h"
-#include "agent/TemporaryDirectory.h"
-
 #include <gmock/gmock.h>
 #include <unistd.h>
 
 #include <filesystem>
+
+#include "agent/Probe.h"
+#include "agent/TemporaryDirectory.h"
 
 using agent_test::ProbeResult;
 using agent_test::runProbe;

@@ -1,11 +1,10 @@
-#include "KO/DateTime.h"
-
-#include "KO/Utils.h"
-
 #include <gtest/gtest.h>
 
 #include <cstdlib>
 #include <ctime>
+
+#include "KO/DateTime.h"
+#include "KO/Utils.h"
 
 using KO::DateTime;
 using KO::Utils;

@@ -1,8 +1,7 @@
-#include "configuration/Document.h"
+#include <gmock/gmock.h>
 
 #include "agent/TemporaryDirectory.h"
-
-#include <gmock/gmock.h>
+#include "configuration/Document.h"
 
 using Agent::Document;
 using Agent::Problems;

@@ -1,11 +1,10 @@
-#include "configuration/FileContent.h"
-
-#include "agent/TemporaryDirectory.h"
-
 #include <gtest/gtest.h>
 #include <sys/stat.h>
 
 #include <cerrno>
+
+#include "agent/TemporaryDirectory.h"
+#include "configuration/FileContent.h"
 
 using Agent::FileContent;
 using Agent::readFile;

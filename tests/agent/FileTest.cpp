@@ -1,15 +1,14 @@
-#include "KO/File.h"
-
-#include "KO/Exceptions.h"
-#include "KO/Strings.h"
-#include "agent/TemporaryDirectory.h"
-#include "support/Umask.h"
-
 #include <gmock/gmock.h>
 #include <sys/stat.h>
 
 #include <filesystem>
 #include <utility>
+
+#include "KO/Exceptions.h"
+#include "KO/File.h"
+#include "KO/Strings.h"
+#include "agent/TemporaryDirectory.h"
+#include "support/Umask.h"
 
 using agent_test::TemporaryDirectory;
 using KO::File;

@@ -1,9 +1,9 @@
-#include "KO/Instrumentation.h"
-
 #include <gmock/gmock.h>
 
 #include <thread>
 #include <vector>
+
+#include "KO/Instrumentation.h"
 
 using KO::Instrumentation;
 using KO::NodeLexicon::NodeType;

@@ -1,8 +1,8 @@
-#include "logging/Levels.h"
-
 #include <gtest/gtest.h>
 
 #include <string>
+
+#include "logging/Levels.h"
 
 using RZLog::Channel;
 using RZLog::Levels;

@@ -1,5 +1,3 @@
-#include "KO/Exceptions.h"
-
 #include <cxxabi.h>
 #include <dlfcn.h>
 #include <elf.h>
@@ -9,6 +7,8 @@
 #include <memory>
 #include <string>
 #include <vector>
+
+#include "KO/Exceptions.h"
 
 using testing::Each;
 using testing::StartsWith;

@@ -1,13 +1,12 @@
-#include "logging/Sinks.h"
-
-#include "agent/TemporaryDirectory.h"
-
 #include <gmock/gmock.h>
 #include <unistd.h>
 
 #include <filesystem>
 #include <set>
 #include <system_error>
+
+#include "agent/TemporaryDirectory.h"
+#include "logging/Sinks.h"
 
 using RZLog::LogSettings;
 using testing::ElementsAre;

@@ -1,12 +1,12 @@
-#include "agent/Probe.h"
-#include "agent/TemporaryDirectory.h"
-
 #include <gmock/gmock.h>
 #include <sys/stat.h>
 
 #include <algorithm>
 #include <filesystem>
 #include <sstream>
+
+#include "agent/Probe.h"
+#include "agent/TemporaryDirectory.h"
 
 using agent_test::ProbeResult;
 using agent_test::runProbe;

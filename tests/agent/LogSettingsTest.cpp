@@ -1,8 +1,7 @@
-#include "logging/LogSettings.h"
+#include <gmock/gmock.h>
 
 #include "agent/ShippedConfiguration.h"
-
-#include <gmock/gmock.h>
+#include "logging/LogSettings.h"
 
 using RZLog::Channel;
 using RZLog::LogSettings;

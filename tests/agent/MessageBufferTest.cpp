@@ -1,5 +1,3 @@
-#include "RZLog/RZMessageBuffer.h"
-
 #include <gtest/gtest.h>
 
 #include <iomanip>
@@ -7,6 +5,8 @@
 #include <memory>
 #include <thread>
 #include <vector>
+
+#include "RZLog/RZMessageBuffer.h"
 
 using RZLog::RZMessageBuffer;
 

@@ -1,6 +1,6 @@
-#include "KO/Moniker.h"
-
 #include <gtest/gtest.h>
+
+#include "KO/Moniker.h"
 
 using KO::Moniker;
 

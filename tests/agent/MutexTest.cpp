@@ -1,10 +1,9 @@
-#include "KO/Mutex.h"
-
-#include "KO/Exceptions.h"
-
 #include <gmock/gmock.h>
 
 #include <thread>
+
+#include "KO/Exceptions.h"
+#include "KO/Mutex.h"
 
 using KO::FrameworkException;
 using KO::Mutex;

@@ -1,6 +1,6 @@
-#include "framework/NodeTree.h"
-
 #include <gtest/gtest.h>
+
+#include "framework/NodeTree.h"
 
 using KO::pathToText;
 using KO::textToPath;

@@ -1,6 +1,6 @@
-#include "framework/NodeTree.h"
-
 #include <gmock/gmock.h>
+
+#include "framework/NodeTree.h"
 
 using KO::Node;
 using KO::NodeTree;

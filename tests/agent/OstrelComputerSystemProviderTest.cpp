@@ -1,10 +1,10 @@
-#include "agent/PlainValues.h"
-#include "broker/RequestScope.h"
-
 #include <cmpift.h>
 #include <gmock/gmock.h>
 
 #include <thread>
+
+#include "agent/PlainValues.h"
+#include "broker/RequestScope.h"
 
 extern "C" CMPIInstanceMI* OstrelComputerSystemProvider_Create_InstanceMI(const CMPIBroker*, const CMPIContext*,
                                                                           CMPIStatus*);

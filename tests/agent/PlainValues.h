@@ -1,9 +1,9 @@
 #pragma once
 
-#include "model/Value.h"
-
 #include <string>
 #include <utility>
+
+#include "model/Value.h"
 
 namespace agent_test {
 

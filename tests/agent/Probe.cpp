@@ -1,7 +1,5 @@
 #include "agent/Probe.h"
 
-#include "agent/TemporaryDirectory.h"
-
 #include <fcntl.h>
 #include <spawn.h>
 #include <sys/wait.h>
@@ -9,6 +7,8 @@
 
 #include <cstring>
 #include <utility>
+
+#include "agent/TemporaryDirectory.h"
 
 namespace agent_test {
 

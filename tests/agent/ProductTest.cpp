@@ -1,9 +1,8 @@
-#include "KO/Product.h"
+#include <gtest/gtest.h>
 
 #include "KO/PlatformUtilities.h"
+#include "KO/Product.h"
 #include "agent/TestConfiguration.h"
-
-#include <gtest/gtest.h>
 
 using KO::PlatformUtilities;
 using KO::Product;

@@ -1,12 +1,11 @@
-#include "KO/PropertyFile.h"
+#include <gmock/gmock.h>
+#include <sys/stat.h>
 
 #include "KO/Exceptions.h"
+#include "KO/PropertyFile.h"
 #include "KO/Strings.h"
 #include "KO/Utils.h"
 #include "agent/TemporaryDirectory.h"
-
-#include <gmock/gmock.h>
-#include <sys/stat.h>
 
 using KO::DateTime;
 using KO::FrameworkException;

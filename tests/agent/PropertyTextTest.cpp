@@ -1,6 +1,6 @@
-#include "framework/PropertyText.h"
-
 #include <gtest/gtest.h>
+
+#include "framework/PropertyText.h"
 
 using KO::PropertyText;
 

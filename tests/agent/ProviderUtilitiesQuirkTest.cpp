@@ -1,10 +1,10 @@
-#include "KO/Moniker.h"
-#include "KO/ProviderUtilities.h"
-
 #include <cmpift.h>
 #include <gtest/gtest.h>
 
 #include <string>
+
+#include "KO/Moniker.h"
+#include "KO/ProviderUtilities.h"
 
 using KO::Moniker;
 using KO::ProviderUtilities;

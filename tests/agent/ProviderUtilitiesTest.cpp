@@ -1,10 +1,9 @@
-#include "KO/ProviderUtilities.h"
+#include <gmock/gmock.h>
 
 #include "KO/Moniker.h"
+#include "KO/ProviderUtilities.h"
 #include "agent/PlainValues.h"
 #include "broker/RequestScope.h"
-
-#include <gmock/gmock.h>
 
 using agent_test::nullOf;
 using agent_test::plain;

@@ -1,8 +1,8 @@
-#include "logging/Record.h"
-
 #include <gmock/gmock.h>
 
 #include <ctime>
+
+#include "logging/Record.h"
 
 using RZLog::Channel;
 using RZLog::Record;

@@ -1,9 +1,3 @@
-#include "framework/FileAccess.h"
-
-#include "KO/Exceptions.h"
-#include "agent/TemporaryDirectory.h"
-#include "support/Umask.h"
-
 #include <gmock/gmock.h>
 #include <grp.h>
 #include <gtest/gtest.h>
@@ -16,6 +10,11 @@
 #include <filesystem>
 #include <utility>
 #include <vector>
+
+#include "KO/Exceptions.h"
+#include "agent/TemporaryDirectory.h"
+#include "framework/FileAccess.h"
+#include "support/Umask.h"
 
 using agent_test::TemporaryDirectory;
 using KO::replaceFile;

@@ -1,7 +1,5 @@
 // A process with more rights than its caller must ignore the caller's environment.
 
-#include "agent/Probe.h"
-
 #include <gmock/gmock.h>
 #include <sys/stat.h>
 #include <unistd.h>
@@ -15,6 +13,8 @@
 #include <memory>
 #include <sstream>
 #include <vector>
+
+#include "agent/Probe.h"
 
 using agent_test::ProbeResult;
 using testing::HasSubstr;

@@ -1,6 +1,6 @@
-#include "KO/Strings.h"
-
 #include <gtest/gtest.h>
+
+#include "KO/Strings.h"
 
 using KO::make_string;
 using KO::make_wstring;

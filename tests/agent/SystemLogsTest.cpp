@@ -1,7 +1,3 @@
-#include "logging/Sinks.h"
-
-#include "agent/TemporaryDirectory.h"
-
 #include <gmock/gmock.h>
 #include <sys/socket.h>
 #include <sys/un.h>
@@ -11,6 +7,9 @@
 #include <optional>
 #include <ostream>
 #include <vector>
+
+#include "agent/TemporaryDirectory.h"
+#include "logging/Sinks.h"
 
 using testing::ElementsAre;
 using testing::EndsWith;

@@ -1,8 +1,7 @@
-#include "configuration/TableReader.h"
+#include <gmock/gmock.h>
 
 #include "configuration/Document.h"
-
-#include <gmock/gmock.h>
+#include "configuration/TableReader.h"
 
 using Agent::Document;
 using Agent::Problems;

@@ -1,8 +1,8 @@
 #include "agent/TestConfiguration.h"
 
-#include "agent/TemporaryDirectory.h"
-
 #include <memory>
+
+#include "agent/TemporaryDirectory.h"
 
 namespace agent_test {
 

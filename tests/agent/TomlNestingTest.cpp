@@ -1,8 +1,6 @@
-#include "configuration/Document.h"
-
-#include "configuration/Document.h"
-
 #include <gmock/gmock.h>
+
+#include "configuration/Document.h"
 
 using Agent::deepestNesting;
 using Agent::lineNestedTooDeep;

@@ -1,6 +1,6 @@
-#include "cim/DateTime.h"
-
 #include <gtest/gtest.h>
+
+#include "cim/DateTime.h"
 
 using cim::formatPointInTime;
 using cim::isDateTime;

@@ -1,8 +1,8 @@
-#include "cim/Names.h"
-
 #include <gtest/gtest.h>
 
 #include <map>
+
+#include "cim/Names.h"
 
 TEST(CimNames, AreTheSameInAnyCaseOfLetters) {
     EXPECT_TRUE(cim::sameName("VELKO_Lease", "velko_LEASE"));

@@ -1,8 +1,8 @@
-#include "cim/Utf8.h"
-
 #include <gtest/gtest.h>
 
 #include <ostream>
+
+#include "cim/Utf8.h"
 
 using cim::firstCharacter;
 using cim::Utf8Character;

@@ -1,7 +1,7 @@
 // The broker and its tables.
-#include "Layout.h"
-
 #include <cmpift.h>
+
+#include "Layout.h"
 
 LAYOUT_SIZE(CMPIBroker, 5 * sizeof(void*));
 LAYOUT_SLOT(CMPIBroker, 0, hdl, void*);

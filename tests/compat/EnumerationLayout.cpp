@@ -1,7 +1,7 @@
 // Enumerations.
-#include "Layout.h"
-
 #include <cmpidt.h>
+
+#include "Layout.h"
 
 static_assert(std::is_same_v<CMPIrc, enum _CMPIrc>);
 LAYOUT_VALUE(sizeof(CMPIrc), 4);

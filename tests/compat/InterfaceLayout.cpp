@@ -1,7 +1,7 @@
 // The management interfaces.
-#include "Layout.h"
-
 #include <cmpift.h>
+
+#include "Layout.h"
 
 LAYOUT_INTERFACE(CMPIInstanceMI, const void*, 10);
 LAYOUT_SLOT(CMPIInstanceMIFT, 2, cleanup, CMPIStatus (*)(CMPIInstanceMI*, const CMPIContext*, CMPIBoolean));

@@ -1,7 +1,7 @@
 // Instances, object paths and values.
-#include "Layout.h"
-
 #include <cmpift.h>
+
+#include "Layout.h"
 
 LAYOUT_OBJECT(CMPIInstance, void*);
 LAYOUT_TABLE(CMPIInstanceFT, 11);

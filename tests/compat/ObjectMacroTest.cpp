@@ -1,7 +1,7 @@
-#include "compat/Recorder.h"
-
 #include <cmpimacs.h>
 #include <gtest/gtest.h>
+
+#include "compat/Recorder.h"
 
 namespace {
 

@@ -1,7 +1,7 @@
 // Queries, their conditions and predicates.
-#include "Layout.h"
-
 #include <cmpift.h>
+
+#include "Layout.h"
 
 LAYOUT_OBJECT(CMPISelectExp, void*);
 LAYOUT_TABLE(CMPISelectExpFT, 8);

@@ -1,7 +1,7 @@
 // Context, result and error.
-#include "Layout.h"
-
 #include <cmpift.h>
+
+#include "Layout.h"
 
 LAYOUT_OBJECT(CMPIContext, void*);
 LAYOUT_TABLE(CMPIContextFT, 7);

@@ -1,10 +1,9 @@
-#include "compat/SmallProviders.h"
-
-#include "compat/Recorder.h"
-
 #include <gtest/gtest.h>
 
 #include <string>
+
+#include "compat/Recorder.h"
+#include "compat/SmallProviders.h"
 
 namespace {
 

@@ -1,9 +1,9 @@
 // Scalars, values, types, codes and names.
-#include "Layout.h"
-
 #include <cmpidt.h>
 
 #include <string_view>
+
+#include "Layout.h"
 
 // Scalars
 static_assert(std::is_same_v<CMPICount, unsigned int>);

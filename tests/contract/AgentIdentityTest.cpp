@@ -1,9 +1,9 @@
+#include <algorithm>
+#include <filesystem>
+
 #include "ProviderFixture.h"
 #include "support/AgentConfiguration.h"
 #include "support/Files.h"
-
-#include <algorithm>
-#include <filesystem>
 
 // The agent's instance, VELKO_OstrelAgent.
 

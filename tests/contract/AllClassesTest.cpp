@@ -1,12 +1,12 @@
-#include "AssetFixture.h"
-#include "AssociationFixture.h"
-#include "schema/MofReader.h"
-#include "schema/MofWriter.h"
-
 #include <algorithm>
 #include <filesystem>
 #include <iterator>
 #include <set>
+
+#include "AssetFixture.h"
+#include "AssociationFixture.h"
+#include "schema/MofReader.h"
+#include "schema/MofWriter.h"
 
 // Properties of every class: the table below matches the MOF, keys have the order of paths and other properties the
 // order of instances, and the operations are consistent with each other.

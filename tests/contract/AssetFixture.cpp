@@ -1,9 +1,9 @@
 #include "AssetFixture.h"
 
-#include "schema/MofWriter.h"
-
 #include <algorithm>
 #include <sstream>
+
+#include "schema/MofWriter.h"
 
 namespace contract {
 

@@ -1,9 +1,9 @@
 #pragma once
 
-#include "ProviderFixture.h"
-
 #include <string>
 #include <vector>
+
+#include "ProviderFixture.h"
 
 namespace contract {
 

@@ -1,8 +1,8 @@
-#include "AssetFixture.h"
-
 #include <cmpift.h>
 
 #include <functional>
+
+#include "AssetFixture.h"
 
 // The provider holds no lock while it calls the object manager: such a call may make another request that needs the
 // asset file.

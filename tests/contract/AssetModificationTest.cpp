@@ -1,7 +1,7 @@
+#include <filesystem>
+
 #include "AssetFixture.h"
 #include "ThrowingObjects.h"
-
-#include <filesystem>
 
 // Modification of the asset identification.
 

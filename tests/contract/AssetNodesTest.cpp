@@ -1,7 +1,7 @@
+#include <memory>
+
 #include "AssetFixture.h"
 #include "support/AgentConfiguration.h"
-
-#include <memory>
 
 // The asset identification with missing nodes or properties, and with more than one computer.
 

@@ -1,7 +1,7 @@
-#include "AssetFixture.h"
-
 #include <algorithm>
 #include <filesystem>
+
+#include "AssetFixture.h"
 
 // Reading the asset identification.
 

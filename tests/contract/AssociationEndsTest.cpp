@@ -1,7 +1,7 @@
-#include "AssociationFixture.h"
-
 #include <optional>
 #include <utility>
+
+#include "AssociationFixture.h"
 
 // Associators and AssociatorNames.
 

@@ -1,6 +1,6 @@
-#include "AssociationFixture.h"
-
 #include <cmpift.h>
+
+#include "AssociationFixture.h"
 
 // Failures of each function of the object manager during association requests.
 

@@ -1,9 +1,9 @@
 #include "AssociationFixture.h"
 
-#include "schema/MofWriter.h"
-
 #include <algorithm>
 #include <iterator>
+
+#include "schema/MofWriter.h"
 
 namespace contract {
 

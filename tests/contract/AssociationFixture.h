@@ -1,11 +1,11 @@
 #pragma once
 
-#include "ProviderFixture.h"
-#include "support/AgentConfiguration.h"
-
 #include <ostream>
 #include <string>
 #include <vector>
+
+#include "ProviderFixture.h"
+#include "support/AgentConfiguration.h"
 
 namespace contract {
 

@@ -1,6 +1,6 @@
-#include "AssociationFixture.h"
-
 #include <cctype>
+
+#include "AssociationFixture.h"
 
 // Enumeration of an association class: pairs of a computer system and a record.
 

@@ -1,7 +1,7 @@
-#include "RecordFixture.h"
-
 #include <functional>
 #include <map>
+
+#include "RecordFixture.h"
 
 // Requests with a broker whose functions fail.
 

@@ -1,9 +1,9 @@
-#include "RecordFixture.h"
-#include "support/Umask.h"
-
 #include <algorithm>
 #include <filesystem>
 #include <utility>
+
+#include "RecordFixture.h"
+#include "support/Umask.h"
 
 // Content of the record files, byte for byte, and reading it after a restart.
 

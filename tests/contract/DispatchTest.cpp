@@ -1,6 +1,6 @@
-#include "ProviderFixture.h"
-
 #include <functional>
+
+#include "ProviderFixture.h"
 
 // Operations by class, and operations with a fixed status.
 

@@ -1,8 +1,8 @@
-#include "RecordFixture.h"
-#include "ThrowingObjects.h"
-
 #include <functional>
 #include <stdexcept>
+
+#include "RecordFixture.h"
+#include "ThrowingObjects.h"
 
 // Object manager functions that throw C++ exceptions.
 

@@ -1,9 +1,8 @@
-#include "RecordFixture.h"
-
 #include <algorithm>
 #include <fstream>
 #include <random>
 
+#include "RecordFixture.h"
 #include "support/Files.h"
 
 // Malicious strings of clients in memory, in the file and in the log.

@@ -1,8 +1,3 @@
-#include "RecordFixture.h"
-
-#include "support/Files.h"
-#include "support/UnderTest.h"
-
 #include <dlfcn.h>
 #include <elf.h>
 
@@ -11,6 +6,10 @@
 #include <cstring>
 #include <memory>
 #include <stdexcept>
+
+#include "RecordFixture.h"
+#include "support/Files.h"
+#include "support/UnderTest.h"
 
 // The built library as a file; loading and unloading.
 

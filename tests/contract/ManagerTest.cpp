@@ -1,6 +1,6 @@
-#include "RecordFixture.h"
-
 #include <tuple>
+
+#include "RecordFixture.h"
 
 // Behaviour of brokers and values of existing object managers.
 

@@ -1,6 +1,6 @@
-#include "RecordFixture.h"
-
 #include <limits>
+
+#include "RecordFixture.h"
 
 // Modification of records.
 

@@ -1,14 +1,14 @@
 #include "ProviderFixture.h"
 
-#include "schema/Literal.h"
-#include "schema/MofWriter.h"
-#include "support/Files.h"
-#include "support/UnderTest.h"
-
 #include <dlfcn.h>
 
 #include <algorithm>
 #include <regex>
+
+#include "schema/Literal.h"
+#include "schema/MofWriter.h"
+#include "support/Files.h"
+#include "support/UnderTest.h"
 
 namespace contract {
 

@@ -1,11 +1,5 @@
 #pragma once
 
-#include "support/AgentEnvironment.h"
-#include "support/Outcome.h"
-#include "support/ProviderLibrary.h"
-#include "support/RecordingBroker.h"
-#include "support/Values.h"
-
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
@@ -14,6 +8,12 @@
 #include <optional>
 #include <string>
 #include <vector>
+
+#include "support/AgentEnvironment.h"
+#include "support/Outcome.h"
+#include "support/ProviderLibrary.h"
+#include "support/RecordingBroker.h"
+#include "support/Values.h"
 
 namespace contract {
 

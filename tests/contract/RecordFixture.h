@@ -1,11 +1,11 @@
 #pragma once
 
-#include "ProviderFixture.h"
-#include "support/RecordModel.h"
-
 #include <ostream>
 #include <string>
 #include <vector>
+
+#include "ProviderFixture.h"
+#include "support/RecordModel.h"
 
 namespace contract {
 

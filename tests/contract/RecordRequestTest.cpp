@@ -1,5 +1,4 @@
 #include "RecordFixture.h"
-
 #include "support/Values.h"
 
 // Reading and deleting records.

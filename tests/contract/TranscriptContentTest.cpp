@@ -1,9 +1,9 @@
-#include "TranscriptFixture.h"
-
 #include <algorithm>
 #include <map>
 #include <regex>
 #include <set>
+
+#include "TranscriptFixture.h"
 
 // Content of transcripts: levels, loggers, and records that differ between scenarios.
 

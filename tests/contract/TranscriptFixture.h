@@ -1,9 +1,9 @@
 #pragma once
 
-#include "TranscriptScenarios.h"
-
 #include <string>
 #include <vector>
+
+#include "TranscriptScenarios.h"
 
 namespace contract {
 

@@ -1,11 +1,11 @@
-#include "TranscriptFixture.h"
-#include "support/Files.h"
-
 #include <algorithm>
 #include <map>
 #include <regex>
 #include <set>
 #include <tuple>
+
+#include "TranscriptFixture.h"
+#include "support/Files.h"
 
 // Format of transcripts: channels, messages, separators around requests, nesting of functions.
 

@@ -1,6 +1,3 @@
-#include "TranscriptFixture.h"
-#include "support/Files.h"
-
 #include <algorithm>
 #include <cstdlib>
 #include <filesystem>
@@ -8,6 +5,9 @@
 #include <regex>
 #include <set>
 #include <sstream>
+
+#include "TranscriptFixture.h"
+#include "support/Files.h"
 
 // Compares each scenario's log with its golden file.
 //

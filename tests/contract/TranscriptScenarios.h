@@ -1,12 +1,12 @@
 #pragma once
 
-#include "AssociationFixture.h"
-#include "ProviderFixture.h"
-
 #include <functional>
 #include <ostream>
 #include <string>
 #include <vector>
+
+#include "AssociationFixture.h"
+#include "ProviderFixture.h"
 
 namespace contract {
 

@@ -1,12 +1,12 @@
-#include "TranscriptFixture.h"
-#include "support/Files.h"
-
 #include <algorithm>
 #include <filesystem>
 #include <map>
 #include <regex>
 #include <set>
 #include <sstream>
+
+#include "TranscriptFixture.h"
+#include "support/Files.h"
 
 // The sources that the line numbers of records belong to, as documented in docs/log-records.md.
 

@@ -1,6 +1,3 @@
-#include "RecordFixture.h"
-#include "support/Files.h"
-
 #include <fcntl.h>
 #include <gmock/gmock.h>
 #include <sys/stat.h>
@@ -9,6 +6,9 @@
 #include <unistd.h>
 
 #include <sstream>
+
+#include "RecordFixture.h"
+#include "support/Files.h"
 
 // System calls of a rewrite per line of the record file. Records all C library functions that write to or use an open
 // file.

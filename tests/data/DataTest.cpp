@@ -1,16 +1,15 @@
-#include "gate/GateFixture.h"
-#include "support/Files.h"
-#include "support/UnderTest.h"
-
-#include <nlohmann/json.hpp>
-
 #include <sys/wait.h>
 #include <unistd.h>
 
 #include <cstdio>
 #include <functional>
+#include <nlohmann/json.hpp>
 #include <regex>
 #include <stdexcept>
+
+#include "gate/GateFixture.h"
+#include "support/Files.h"
+#include "support/UnderTest.h"
 
 // lease-warranty-data with record files that the gate has written.
 

@@ -1,9 +1,6 @@
-#include "durable/DataDirectory.h"
-
+#include <fcntl.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
-
-#include <fcntl.h>
 #include <sys/stat.h>
 #include <sys/wait.h>
 #include <unistd.h>
@@ -13,6 +10,7 @@
 #include <vector>
 
 #include "LockErrors.h"
+#include "durable/DataDirectory.h"
 #include "support/Files.h"
 
 namespace durable {

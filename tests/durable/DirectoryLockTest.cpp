@@ -1,8 +1,5 @@
-#include "durable/DirectoryLock.h"
-
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
-
 #include <sys/wait.h>
 #include <unistd.h>
 
@@ -12,6 +9,7 @@
 #include <system_error>
 
 #include "LockErrors.h"
+#include "durable/DirectoryLock.h"
 #include "support/Files.h"
 
 namespace durable {

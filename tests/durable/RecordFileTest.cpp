@@ -1,8 +1,5 @@
-#include "durable/RecordFile.h"
-
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
-
 #include <sys/stat.h>
 #include <sys/wait.h>
 #include <unistd.h>
@@ -11,6 +8,7 @@
 #include <string>
 #include <system_error>
 
+#include "durable/RecordFile.h"
 #include "support/Files.h"
 
 namespace durable {

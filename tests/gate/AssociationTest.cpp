@@ -1,6 +1,6 @@
-#include "GateFixture.h"
-
 #include <map>
+
+#include "GateFixture.h"
 
 // The associations of computers with their leases and warranties. Six operations find them and must agree.
 

@@ -1,10 +1,9 @@
-#include "GateFixture.h"
-
 #include <functional>
 #include <map>
 #include <set>
 #include <stdexcept>
 
+#include "GateFixture.h"
 #include "schema/MofWriter.h"
 
 // Brokers whose functions fail, return null or throw.

@@ -1,7 +1,5 @@
 #pragma once
 
-#include "gate/session/RequestLock.h"
-
 #include <algorithm>
 #include <chrono>
 #include <condition_variable>
@@ -10,6 +8,8 @@
 #include <string>
 #include <thread>
 #include <vector>
+
+#include "gate/session/RequestLock.h"
 
 // Helpers of the tests of the request lock.
 

@@ -1,12 +1,5 @@
 #pragma once
 
-#include "support/AgentEnvironment.h"
-#include "support/Files.h"
-#include "support/Outcome.h"
-#include "support/ProviderLibrary.h"
-#include "support/RecordingBroker.h"
-#include "support/Values.h"
-
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
@@ -16,6 +9,13 @@
 #include <string>
 #include <utility>
 #include <vector>
+
+#include "support/AgentEnvironment.h"
+#include "support/Files.h"
+#include "support/Outcome.h"
+#include "support/ProviderLibrary.h"
+#include "support/RecordingBroker.h"
+#include "support/Values.h"
 
 namespace gatetest {
 

@@ -1,8 +1,7 @@
-#include "GateFixture.h"
-
 #include <cstdio>
 #include <memory>
 
+#include "GateFixture.h"
 #include "broker/RequestScope.h"
 #include "support/UnderTest.h"
 

@@ -1,9 +1,5 @@
-#include "EventLog.h"
-#include "gate/session/ProviderSession.h"
-
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
-
 #include <sys/wait.h>
 #include <unistd.h>
 
@@ -13,6 +9,9 @@
 #include <string>
 #include <thread>
 #include <vector>
+
+#include "EventLog.h"
+#include "gate/session/ProviderSession.h"
 
 // The request lock: closing, closed and reopened.
 

@@ -1,8 +1,7 @@
-#include "GateFixture.h"
-
-#include "support/Files.h"
-
 #include <dlfcn.h>
+
+#include "GateFixture.h"
+#include "support/Files.h"
 
 // Values that do not survive a round trip through the data files.
 

@@ -1,10 +1,10 @@
 #include "ManagedGate.h"
 
+#include <regex>
+
 #include "schema/MofReader.h"
 #include "support/Files.h"
 #include "support/UnderTest.h"
-
-#include <regex>
 
 namespace gatetest {
 

@@ -1,5 +1,3 @@
-#include "GateFixture.h"
-
 #include <dlfcn.h>
 #include <execinfo.h>
 
@@ -9,6 +7,7 @@
 #include <functional>
 #include <new>
 
+#include "GateFixture.h"
 #include "support/UnderTest.h"
 
 // Each allocation of the gate fails in turn.

@@ -1,9 +1,9 @@
+#include <unistd.h>
+
 #include "GateFixture.h"
 #include "SimulatedDisk.h"
 #include "durable/RecordFile.h"
 #include "support/FullDisk.h"
-
-#include <unistd.h>
 
 // Power failures during changes, before and after each operation on files.
 

@@ -1,5 +1,4 @@
 #include "GateFixture.h"
-
 #include "support/Files.h"
 #include "support/FullDisk.h"
 

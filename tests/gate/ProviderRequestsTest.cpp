@@ -1,6 +1,6 @@
-#include "GateFixture.h"
-
 #include <functional>
+
+#include "GateFixture.h"
 
 // The provider's requests behind a client's request, in order.
 

@@ -1,5 +1,4 @@
 #include "GateFixture.h"
-
 #include "support/Files.h"
 
 // Reading all classes, and changing asset data.

@@ -1,5 +1,4 @@
 #include "GateFixture.h"
-
 #include "support/Files.h"
 
 // Leases and warranties through the gate.

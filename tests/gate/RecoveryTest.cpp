@@ -1,11 +1,11 @@
-#include "GateFixture.h"
-#include "support/Files.h"
-
 #include <unistd.h>
 
 #include <cstdlib>
 #include <regex>
 #include <set>
+
+#include "GateFixture.h"
+#include "support/Files.h"
 
 // Recovery of record files before the provider reads them.
 

@@ -1,5 +1,3 @@
-#include "GateFixture.h"
-
 #include <atomic>
 #include <chrono>
 #include <condition_variable>
@@ -7,6 +5,8 @@
 #include <cstdlib>
 #include <mutex>
 #include <thread>
+
+#include "GateFixture.h"
 
 // Providers that call the gate while the gate waits for their response to an up-call.
 

@@ -1,14 +1,13 @@
-#include "EventLog.h"
-
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
-
 #include <pthread.h>
 
 #include <algorithm>
 #include <string>
 #include <thread>
 #include <vector>
+
+#include "EventLog.h"
 
 // The order in which requests acquire the lock.
 

@@ -1,12 +1,10 @@
-#include "ManagedGate.h"
-
-#include "support/Files.h"
-
 #include <condition_variable>
 #include <mutex>
 #include <thread>
 
+#include "ManagedGate.h"
 #include "lab/emulation/ManagerEmulation.h"
+#include "support/Files.h"
 
 // Instances that clients read, change and send back, under object managers that alter values.
 

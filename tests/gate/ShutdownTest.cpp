@@ -1,5 +1,3 @@
-#include "GateFixture.h"
-
 #include <condition_variable>
 #include <cstdlib>
 #include <functional>
@@ -7,6 +5,7 @@
 #include <optional>
 #include <thread>
 
+#include "GateFixture.h"
 #include "broker/RequestScope.h"
 #include "support/UnderTest.h"
 

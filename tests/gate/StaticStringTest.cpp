@@ -1,6 +1,6 @@
-#include "gate/cmpi/Failure.h"
-
 #include <gmock/gmock.h>
+
+#include "gate/cmpi/Failure.h"
 
 namespace gate {
 namespace {

@@ -1,16 +1,16 @@
-#include "GateFixture.h"
-
-#include "support/Files.h"
-#include "support/FullDisk.h"
-
 #include <dlfcn.h>
 #include <sys/stat.h>
 #include <sys/statvfs.h>
+
 #include <cerrno>
 #include <chrono>
 #include <cstdio>
 #include <regex>
 #include <set>
+
+#include "GateFixture.h"
+#include "support/Files.h"
+#include "support/FullDisk.h"
 
 // Changes that cannot be stored.
 

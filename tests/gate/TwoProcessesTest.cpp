@@ -1,12 +1,12 @@
-#include "GateFixture.h"
-#include "durable/DirectoryLock.h"
-#include "support/Files.h"
-
 #include <sys/wait.h>
 #include <unistd.h>
 
 #include <functional>
 #include <stdexcept>
+
+#include "GateFixture.h"
+#include "durable/DirectoryLock.h"
+#include "support/Files.h"
 
 // Two processes with the gate on one data directory: one owns it and makes changes, the other reads.
 

@@ -1,5 +1,4 @@
 #include "GateFixture.h"
-
 #include "broker/RequestScope.h"
 
 // Creations whose path the object manager does not accept.

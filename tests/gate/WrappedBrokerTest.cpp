@@ -1,8 +1,8 @@
-#include "gate/cmpi/WrappedBroker.h"
-
 #include <gtest/gtest.h>
 
 #include <utility>
+
+#include "gate/cmpi/WrappedBroker.h"
 
 // Forwarding to the object manager's broker.
 

@@ -1,8 +1,8 @@
 // Agents without a computer node or without a system node: the asset data are not read.
 
-#include "AssetSupport.h"
-
 #include <gmock/gmock.h>
+
+#include "AssetSupport.h"
 
 namespace {
 

@@ -1,15 +1,15 @@
 // Adapters over a framework that fails, or that writes a value and returns false. The program replaces operations of
 // the framework.
 
+#include <gmock/gmock.h>
+
+#include <functional>
+
 #include "CMPIAssetIDDetail.h"
 #include "KO/Exceptions.h"
 #include "KO/Instrumentation.h"
 #include "KO/ProviderUtilities.h"
 #include "RequestFixture.h"
-
-#include <gmock/gmock.h>
-
-#include <functional>
 
 namespace {
 

@@ -1,13 +1,13 @@
 // Order and locking of the asset element's calls to the framework, and failures of the framework.
 
-#include "AssetFileDouble.h"
-#include "AssetSupport.h"
-#include "KO/Exceptions.h"
-
 #include <gmock/gmock.h>
 
 #include <algorithm>
 #include <stdexcept>
+
+#include "AssetFileDouble.h"
+#include "AssetSupport.h"
+#include "KO/Exceptions.h"
 
 namespace {
 

@@ -1,7 +1,5 @@
 // The asset element as a cursor over the computers, and the properties of each.
 
-#include "AssetSupport.h"
-
 #include <gmock/gmock.h>
 
 #include <cstdio>
@@ -9,6 +7,8 @@
 #include <ctime>
 #include <optional>
 #include <utility>
+
+#include "AssetSupport.h"
 
 namespace {
 

@@ -1,12 +1,12 @@
 #include "AssetFileDouble.h"
 
+#include <filesystem>
+
 #include "KO/File.h"
 #include "KO/Mutex.h"
 #include "KO/PropertyFile.h"
 #include "KO/Strings.h"
 #include "KO/Utils.h"
-
-#include <filesystem>
 
 namespace {
 

@@ -1,9 +1,9 @@
 // Reading the asset data file.
 
+#include <algorithm>
+
 #include "AssetSupport.h"
 #include "KO/Mutex.h"
-
-#include <algorithm>
 
 namespace {
 

@@ -1,8 +1,8 @@
 // Changing and writing the asset data.
 
-#include "AssetSupport.h"
-
 #include <gmock/gmock.h>
+
+#include "AssetSupport.h"
 
 namespace {
 

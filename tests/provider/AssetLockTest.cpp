@@ -1,10 +1,10 @@
 // The asset element waits for the file lock.
 
-#include "AssetSupport.h"
-#include "KO/Mutex.h"
-
 #include <atomic>
 #include <thread>
+
+#include "AssetSupport.h"
+#include "KO/Mutex.h"
 
 namespace {
 

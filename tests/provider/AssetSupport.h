@@ -1,12 +1,12 @@
 #pragma once
 
-#include "AssetIDDetails.h"
-#include "NodesFixture.h"
-#include "Support.h"
-
 #include <string>
 #include <utility>
 #include <vector>
+
+#include "AssetIDDetails.h"
+#include "NodesFixture.h"
+#include "Support.h"
 
 /** Helpers for the tests of the asset element. */
 namespace providerTest {

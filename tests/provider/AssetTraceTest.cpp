@@ -1,8 +1,8 @@
 // Log records of the asset element.
 
-#include "AssetSupport.h"
-
 #include <gmock/gmock.h>
+
+#include "AssetSupport.h"
 
 namespace {
 

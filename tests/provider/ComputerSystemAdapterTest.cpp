@@ -1,14 +1,13 @@
 // The adapter of the computer end, which returns the instances of another provider unchanged.
 
-#include "CMPIComputerSystem.h"
-#include "KO/Exceptions.h"
-#include "Support.h"
-
 #include <cmpift.h>
-
 #include <gmock/gmock.h>
 
 #include <array>
+
+#include "CMPIComputerSystem.h"
+#include "KO/Exceptions.h"
+#include "Support.h"
 
 namespace {
 

@@ -1,8 +1,8 @@
 // Log records of the elements over record stores.
 
-#include "ElementKinds.h"
-
 #include <gmock/gmock.h>
+
+#include "ElementKinds.h"
 
 namespace {
 

@@ -1,9 +1,9 @@
 // Finding records by identifier.
 
+#include <gtest/gtest.h>
+
 #include "IdentifierIndex.h"
 #include "LeaseBase.h"
-
-#include <gtest/gtest.h>
 
 namespace {
 

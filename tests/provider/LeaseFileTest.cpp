@@ -1,8 +1,8 @@
 // Properties of the lease file only: four flags and the order of the thirteen lines.
 
-#include "RecordKinds.h"
-
 #include <iterator>
+
+#include "RecordKinds.h"
 
 namespace {
 

@@ -1,11 +1,11 @@
 // Failures of the framework while loading. The program replaces PlatformUtilities::getKelsaDataDir.
 
-#include "KO/PlatformUtilities.h"
-#include "RecordKinds.h"
-
 #include <gmock/gmock.h>
 
 #include <stdexcept>
+
+#include "KO/PlatformUtilities.h"
+#include "RecordKinds.h"
 
 namespace {
 

@@ -1,8 +1,6 @@
 // Loading with little memory. The program replaces sysconf and operator new, including its nothrow variant, since the
 // operator delete below cannot release memory from a sanitizer's variant.
 
-#include "RecordKinds.h"
-
 #include <dlfcn.h>
 #include <gmock/gmock.h>
 #include <unistd.h>
@@ -10,6 +8,8 @@
 #include <cstdlib>
 #include <limits>
 #include <new>
+
+#include "RecordKinds.h"
 
 namespace {
 

@@ -1,12 +1,12 @@
 // Loading record files with any content, which never fails.
 
-#include "RecordKinds.h"
-
 #include <gmock/gmock.h>
 #include <unistd.h>
 
 #include <locale>
 #include <type_traits>
+
+#include "RecordKinds.h"
 
 namespace {
 

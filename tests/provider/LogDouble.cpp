@@ -1,9 +1,9 @@
 #include "LogDouble.h"
 
+#include <sstream>
+
 #include "RZLog/RZLogger.h"
 #include "RZLog/RZMessageBuffer.h"
-
-#include <sstream>
 
 namespace logDouble {
 

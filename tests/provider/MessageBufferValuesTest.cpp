@@ -1,17 +1,16 @@
 // Values of the provider's parameter lists, inserted into a message buffer directly, not through its stream.
 
-#include "KO/Moniker.h"
-#include "LeaseBase.h"
-#include "RZLog/RZMessageBuffer.h"
-#include "WarrantyBase.h"
-
 #include <cmpift.h>
-
 #include <gtest/gtest.h>
 
 #include <fstream>
 #include <sstream>
 #include <string>
+
+#include "KO/Moniker.h"
+#include "LeaseBase.h"
+#include "RZLog/RZMessageBuffer.h"
+#include "WarrantyBase.h"
 
 namespace {
 

@@ -1,8 +1,8 @@
 // Requests to a store whose count is not 0 and whose table is empty.
 
-#include "RequestFixture.h"
-
 #include <gmock/gmock.h>
+
+#include "RequestFixture.h"
 
 namespace {
 

@@ -1,5 +1,4 @@
 #include "NodesFixture.h"
-
 #include "framework/AgentState.h"
 
 namespace providerTest {

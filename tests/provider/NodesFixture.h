@@ -1,8 +1,8 @@
 #pragma once
 
-#include "support/AgentConfiguration.h"
-
 #include <string>
+
+#include "support/AgentConfiguration.h"
 
 namespace providerTest {
 

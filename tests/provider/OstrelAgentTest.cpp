@@ -1,9 +1,8 @@
-#include "OstrelAgent.h"
+#include <gmock/gmock.h>
 
 #include "KO/Exceptions.h"
+#include "OstrelAgent.h"
 #include "Support.h"
-
-#include <gmock/gmock.h>
 
 /** Contains letters, to test case-sensitivity. */
 const char* const agentVersion = "4.2.0-Beta";

@@ -1,5 +1,7 @@
 // The adapters of the agent and of the asset identification, constructed from a namespace.
 
+#include <gmock/gmock.h>
+
 #include "CMPIAssetIDDetail.h"
 #include "CMPIOstrelAgent.h"
 #include "KO/ProviderUtilities.h"
@@ -7,8 +9,6 @@
 #include "Support.h"
 #include "broker/Broker.h"
 #include "broker/RequestScope.h"
-
-#include <gmock/gmock.h>
 
 namespace {
 

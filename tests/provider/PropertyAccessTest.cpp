@@ -1,9 +1,9 @@
 // Reading and writing every property number with every type.
 
-#include "RecordKinds.h"
-
 #include <type_traits>
 #include <variant>
+
+#include "RecordKinds.h"
 
 namespace {
 

@@ -1,8 +1,8 @@
 // Creation and deletion of records.
 
-#include "RecordKinds.h"
-
 #include <gmock/gmock.h>
+
+#include "RecordKinds.h"
 
 namespace {
 

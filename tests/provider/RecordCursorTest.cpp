@@ -1,8 +1,8 @@
 // Position and movement of a cursor over the records.
 
-#include "RecordKinds.h"
-
 #include <gmock/gmock.h>
+
+#include "RecordKinds.h"
 
 namespace {
 

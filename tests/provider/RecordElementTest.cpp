@@ -1,8 +1,8 @@
 // Common behaviour of the lease and the warranty element: filters, creation and removal.
 
-#include "ElementKinds.h"
-
 #include <gmock/gmock.h>
+
+#include "ElementKinds.h"
 
 namespace {
 

@@ -1,15 +1,15 @@
 #pragma once
 
-#include "KO/Exceptions.h"
-#include "LeaseBase.h"
-#include "Support.h"
-#include "WarrantyBase.h"
-
 #include <memory>
 #include <string>
 #include <tuple>
 #include <utility>
 #include <vector>
+
+#include "KO/Exceptions.h"
+#include "LeaseBase.h"
+#include "Support.h"
+#include "WarrantyBase.h"
 
 /** Parameters of typed tests: the two record stores. */
 namespace providerTest {

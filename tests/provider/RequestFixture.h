@@ -1,5 +1,9 @@
 #pragma once
 
+#include <string>
+#include <utility>
+#include <vector>
+
 #include "LeaseAndWarrantyProvider.h"
 #include "LeaseBase.h"
 #include "Support.h"
@@ -7,10 +11,6 @@
 #include "broker/Broker.h"
 #include "broker/RequestScope.h"
 #include "model/ResultEvent.h"
-
-#include <string>
-#include <utility>
-#include <vector>
 
 namespace providerTest {
 

@@ -1,9 +1,9 @@
-#include "RequestFixture.h"
-
 #include <gmock/gmock.h>
 
 #include <map>
 #include <set>
+
+#include "RequestFixture.h"
 
 namespace {
 

@@ -1,11 +1,11 @@
 // Rewriting the record file, and failures to rewrite it.
 
-#include "RecordKinds.h"
-
 #include <gmock/gmock.h>
 
 #include <algorithm>
 #include <stdexcept>
+
+#include "RecordKinds.h"
 
 namespace {
 

@@ -1,5 +1,10 @@
 // Translation between the paths of both ends in the setting adapters.
 
+#include <cmpimacs.h>
+#include <gmock/gmock.h>
+
+#include <sstream>
+
 #include "CMPILeaseSetting.h"
 #include "CMPIWarrantySetting.h"
 #include "KO/ProviderUtilities.h"
@@ -7,12 +12,6 @@
 #include "Support.h"
 #include "broker/Broker.h"
 #include "broker/RequestScope.h"
-
-#include <cmpimacs.h>
-
-#include <gmock/gmock.h>
-
-#include <sstream>
 
 namespace {
 

@@ -1,8 +1,6 @@
 // Exceptions of the framework in a moniker operation, and keys that cannot be selected. The program replaces the
 // operations of Moniker that read keys.
 
-#include "SettingKinds.h"
-
 #include <csignal>
 #include <functional>
 #include <memory>
@@ -10,6 +8,8 @@
 #include <optional>
 #include <set>
 #include <stdexcept>
+
+#include "SettingKinds.h"
 
 namespace {
 

@@ -1,15 +1,15 @@
 #pragma once
 
+#include <memory>
+#include <string>
+#include <utility>
+#include <vector>
+
 #include "ElementKinds.h"
 #include "KO/Moniker.h"
 #include "LeaseSetting.h"
 #include "NodesFixture.h"
 #include "WarrantySetting.h"
-
-#include <memory>
-#include <string>
-#include <utility>
-#include <vector>
 
 /** Parameters of typed tests: the two setting elements. */
 namespace providerTest {

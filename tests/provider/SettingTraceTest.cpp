@@ -1,10 +1,10 @@
 // Log records of the setting elements.
 
-#include "SettingKinds.h"
-
 #include <gmock/gmock.h>
 
 #include <sstream>
+
+#include "SettingKinds.h"
 
 namespace {
 

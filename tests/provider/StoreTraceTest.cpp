@@ -1,10 +1,10 @@
 // Log records of the stores.
 
-#include "RecordKinds.h"
-
 #include <gmock/gmock.h>
 
 #include <algorithm>
+
+#include "RecordKinds.h"
 
 namespace {
 

@@ -1,7 +1,5 @@
 #pragma once
 
-#include "support/AgentEnvironment.h"
-
 #include <gtest/gtest.h>
 
 #include <filesystem>
@@ -10,6 +8,8 @@
 #include <regex>
 #include <string>
 #include <vector>
+
+#include "support/AgentEnvironment.h"
 
 /** Helpers for the tests of the provider's classes. */
 namespace providerTest {

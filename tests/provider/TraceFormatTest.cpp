@@ -1,14 +1,12 @@
-#include "TraceFormat.h"
-
-#include "OtherTraceUnit.h"
-
 #include <gtest/gtest.h>
 
-#include <ostream>
-
 #include <algorithm>
+#include <ostream>
 #include <string>
 #include <utility>
+
+#include "OtherTraceUnit.h"
+#include "TraceFormat.h"
 
 namespace {
 

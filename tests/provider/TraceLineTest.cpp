@@ -1,12 +1,11 @@
-#include "Trace.h"
-
-#include "KO/Exceptions.h"
-#include "Support.h"
-
 #include <gmock/gmock.h>
 
 #include <array>
 #include <sstream>
+
+#include "KO/Exceptions.h"
+#include "Support.h"
+#include "Trace.h"
 
 namespace {
 

@@ -1,11 +1,11 @@
 // Tracing with a logging library that provides RZLogger::admits.
 
-#include "LogDouble.h"
-#include "Trace.h"
-
 #include <gmock/gmock.h>
 
 #include <stdexcept>
+
+#include "LogDouble.h"
+#include "Trace.h"
 
 namespace {
 

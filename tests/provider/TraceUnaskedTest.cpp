@@ -1,9 +1,9 @@
 // Tracing with a logging library that does not provide RZLogger::admits.
 
+#include <gmock/gmock.h>
+
 #include "LogDouble.h"
 #include "Trace.h"
-
-#include <gmock/gmock.h>
 
 namespace {
 

@@ -1,8 +1,7 @@
-#include "support/Recording.h"
-
 #include <cstdarg>
 
 #include "broker/FunctionTables.h"
+#include "support/Recording.h"
 
 // The function tables of RecordingBroker: each slot is the recording function of the standard tables' slot.
 

@@ -1,8 +1,7 @@
-#include "cimxml/XmlElement.h"
-
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include "cimxml/XmlElement.h"
 #include "cimxml/XmlWriter.h"
 
 using namespace cimhost::cimxml;

@@ -1,6 +1,6 @@
-#include "cli/TextLayout.h"
-
 #include <gtest/gtest.h>
+
+#include "cli/TextLayout.h"
 
 // Characters that are wider or narrower than one column.
 

@@ -1,9 +1,8 @@
-#include "support/ProviderLibrary.h"
-
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "operations/LoadedLibrary.h"
+#include "support/ProviderLibrary.h"
 #include "support/Values.h"
 
 namespace {

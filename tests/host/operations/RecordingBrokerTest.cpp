@@ -1,5 +1,3 @@
-#include "support/RecordingBroker.h"
-
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
@@ -7,6 +5,7 @@
 #include <thread>
 
 #include "broker/RequestScope.h"
+#include "support/RecordingBroker.h"
 #include "support/Values.h"
 
 namespace {

@@ -1,11 +1,11 @@
-#include "operations/RequestThread.h"
-
 #include <gtest/gtest.h>
 
 #include <mutex>
 #include <stdexcept>
 #include <thread>
 #include <vector>
+
+#include "operations/RequestThread.h"
 
 namespace {
 

@@ -1,10 +1,9 @@
-#include "server/AccessLog.h"
-
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include <filesystem>
 
+#include "server/AccessLog.h"
 #include "support/Files.h"
 
 using namespace cimhost::server;

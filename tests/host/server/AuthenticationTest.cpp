@@ -1,5 +1,3 @@
-#include "server/Authentication.h"
-
 #include <gmock/gmock.h>
 #include <grp.h>
 #include <gtest/gtest.h>
@@ -9,6 +7,7 @@
 #include <filesystem>
 #include <fstream>
 
+#include "server/Authentication.h"
 #include "support/Files.h"
 
 using namespace cimhost::server;

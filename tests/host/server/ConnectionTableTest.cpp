@@ -1,5 +1,3 @@
-#include "server/ConnectionTable.h"
-
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
@@ -7,6 +5,7 @@
 #include <thread>
 
 #include "TcpPair.h"
+#include "server/ConnectionTable.h"
 
 using namespace cimhost::server;
 using namespace std::chrono_literals;

@@ -1,7 +1,7 @@
-#include "server/HeaderCheck.h"
-
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+
+#include "server/HeaderCheck.h"
 
 using namespace cimhost::server;
 

@@ -1,5 +1,3 @@
-#include "server/HttpServer.h"
-
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
@@ -8,6 +6,7 @@
 
 #include "ServerFixture.h"
 #include "TcpPair.h"
+#include "server/HttpServer.h"
 
 using namespace cimhost;
 using namespace cimhost::server;

@@ -1,9 +1,8 @@
-#include "server/RequestHandler.h"
-
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "ServerFixture.h"
+#include "server/RequestHandler.h"
 
 using namespace cimhost;
 using namespace cimhost::server;

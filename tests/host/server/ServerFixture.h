@@ -33,8 +33,8 @@ public:
         Answer current;
         {
             const std::lock_guard<std::mutex> lock(mutex);
-            principal = request.context.empty() ? std::string{}
-                                                : std::get<std::string>(request.context.front().value.single);
+            principal =
+                request.context.empty() ? std::string{} : std::get<std::string>(request.context.front().value.single);
             current = answer;
         }
         return current(request);

@@ -1,10 +1,9 @@
-#include "server/Settings.h"
-
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include <fstream>
 
+#include "server/Settings.h"
 #include "support/Files.h"
 
 using namespace cimhost::server;

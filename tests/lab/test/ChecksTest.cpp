@@ -1,7 +1,6 @@
-#include "lab/load/Checks.h"
-
 #include <gtest/gtest.h>
 
+#include "lab/load/Checks.h"
 #include "lab/test/Inventory.h"
 
 namespace cimhost::lab {

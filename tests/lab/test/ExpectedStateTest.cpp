@@ -1,7 +1,6 @@
-#include "lab/load/ExpectedState.h"
-
 #include <gmock/gmock.h>
 
+#include "lab/load/ExpectedState.h"
 #include "support/Values.h"
 
 namespace {

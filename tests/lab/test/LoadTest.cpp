@@ -1,8 +1,7 @@
-#include "lab/load/Load.h"
-
 #include <gmock/gmock.h>
 
 #include "lab/emulation/ManagerEmulation.h"
+#include "lab/load/Load.h"
 #include "lab/test/Inventory.h"
 #include "operations/LoadedLibrary.h"
 

@@ -1,7 +1,6 @@
-#include "lab/load/Plan.h"
-
 #include <gmock/gmock.h>
 
+#include "lab/load/Plan.h"
 #include "lab/test/Inventory.h"
 
 namespace {

@@ -1,6 +1,6 @@
-#include "lab/load/Report.h"
-
 #include <gmock/gmock.h>
+
+#include "lab/load/Report.h"
 
 namespace {
 

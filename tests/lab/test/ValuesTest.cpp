@@ -1,8 +1,7 @@
-#include "lab/load/Values.h"
-
 #include <gtest/gtest.h>
 
 #include "cim/DateTime.h"
+#include "lab/load/Values.h"
 #include "model/Value.h"
 #include "schema/MofWriter.h"
 #include "support/Values.h"
