@@ -31,14 +31,14 @@ HttpRequest requestFrom(std::string_view text) {
 void requireComplete(const HttpRequest& request, const CimHeaders& accepted) {
     const Headers& headers = request.headers;
     require(request.method == "POST" || request.method == "M-POST", "only two methods send operations");
-    require(accepted.extensionPrefix.empty() == (request.method == "POST"), "M-POST has a prefix");
+    const std::string prefix = extensionPrefixOf(request);
+    require(prefix.empty() == (request.method == "POST"), "M-POST has a prefix");
     require(headers.count("Origin") == 0, "web pages are refused");
     require(headers.count("Content-Length") <= 1, "the length is unambiguous");
     require(headers.count("Content-Length") == 0 || headers.count("Transfer-Encoding") == 0, "the body has one length");
-    const auto operation = headerIn(headers, accepted.extensionPrefix + "CIMOperation");
+    const auto operation = headerIn(headers, prefix + "CIMOperation");
     require(operation && cim::sameName(*operation, "MethodCall"), "the operation is a method call");
-    requireSame(accepted.object, *percentDecoded(*headerIn(headers, accepted.extensionPrefix + "CIMObject")),
-                "decoded object");
+    requireSame(accepted.object, *percentDecoded(*headerIn(headers, prefix + "CIMObject")), "decoded object");
 }
 
 void requireRefusal(const HttpResponse& response) {
@@ -58,7 +58,7 @@ int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     if (const auto* accepted = std::get_if<CimHeaders>(&checked)) {
         requireComplete(request, *accepted);
     } else {
-        requireRefusal(std::get<HttpResponse>(checked));
+        requireRefusal(withExtension(std::get<HttpResponse>(checked), extensionPrefixOf(request)));
     }
     const auto authorization = headerIn(request.headers, "Authorization");
     const auto credentials = authorization ? credentialsFrom(*authorization) : std::nullopt;

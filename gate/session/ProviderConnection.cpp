@@ -122,10 +122,11 @@ bool ProviderConnection::needsLoading() const {
 void ProviderConnection::requireCurrent(LockGuard& guard) {
     bool isWaiting = false;
     waitWhile(guard, [&] { return isWaiting = needsLoading() && (upCalls != 0 || !load()); });
+    if (isWaiting && upCalls != 0) {
+        fail(CMPI_RC_ERR_FAILED, "The provider waits for the object manager and cannot be loaded again. Try again.");
+    }
     if (isWaiting) {
-        fail(CMPI_RC_ERR_FAILED,
-             upCalls != 0 ? "The provider waits for the object manager and cannot be loaded again. Try again."
-                          : "The record files are incomplete, or another process is writing them. Try again.");
+        fail(CMPI_RC_ERR_FAILED, "The record files are incomplete, or another process is writing them. Try again.");
     }
 }
 
