@@ -94,7 +94,7 @@ DirectoryLock::Result DataDirectory::acquireLock() {
     }
     const bool isDenied =
         result.state == DirectoryLock::State::heldByOther || result.state == DirectoryLock::State::denied;
-    owner = isDenied ? 0 : getpid();
+    owner = isDenied ? 0 : currentProcess();
     return result;
 }
 

@@ -1,11 +1,11 @@
 #pragma once
 
 #include <sys/types.h>
-#include <unistd.h>
 
 #include <array>
 #include <string>
 
+#include "CurrentProcess.h"
 #include "DirectoryLock.h"
 #include "RecordFile.h"
 
@@ -57,7 +57,7 @@ private:
     /** The inodes, sizes and times of the record files. */
     using Stamp = std::array<std::array<long long, 3>, recordFileCount>;
 
-    bool isOwner() const { return owner == getpid(); }
+    bool isOwner() const { return owner == currentProcess(); }
     bool exists() const;
     DirectoryLock::Result acquireLock();
     void recover() const;

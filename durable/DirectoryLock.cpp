@@ -8,6 +8,7 @@
 #include <cerrno>
 #include <system_error>
 
+#include "CurrentProcess.h"
 #include "Files.h"
 
 namespace durable {
@@ -66,7 +67,7 @@ DirectoryLock::Result DirectoryLock::acquire(const std::string& directory) {
     const bool isOpen = descriptor >= 0;
     const int error = isOpen ? tryLock(descriptor) : errno;
     if (error == 0) {
-        process = getpid();
+        process = currentProcess();
         shareWithUsersOf(directory, descriptor);
         writeOwner();
         return {State::acquired};
@@ -85,8 +86,8 @@ DirectoryLock::Result DirectoryLock::acquire(const std::string& directory) {
 bool DirectoryLock::isHeldIn(const std::string& path) const {
     struct stat held {};
     struct stat found {};
-    return descriptor >= 0 && process == getpid() && fstat(descriptor, &held) == 0 && stat(path.c_str(), &found) == 0 &&
-           held.st_dev == found.st_dev && held.st_ino == found.st_ino;
+    return descriptor >= 0 && process == currentProcess() && fstat(descriptor, &held) == 0 &&
+           stat(path.c_str(), &found) == 0 && held.st_dev == found.st_dev && held.st_ino == found.st_ino;
 }
 
 void DirectoryLock::release() {

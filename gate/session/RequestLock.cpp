@@ -1,8 +1,8 @@
 #include "RequestLock.h"
 
-#include <unistd.h>
-
 #include <utility>
+
+#include "durable/CurrentProcess.h"
 
 namespace gate {
 
@@ -55,7 +55,7 @@ bool RequestLock::beginRequest() noexcept {
     if (state != State::open) {
         return false;
     }
-    process = getpid();
+    process = durable::currentProcess();
     ++requests;
     ++requestsHere;
     return true;
@@ -135,7 +135,7 @@ void RequestLock::notifyClosers() {
 
 bool RequestLock::close(std::chrono::milliseconds drainTimeout, Closing closing,
                         const std::function<void()>& atEnd) noexcept {
-    if (process != 0 && process != getpid()) {
+    if (process != 0 && process != durable::currentProcess()) {
         return false;  // the threads that hold the lock and the mutex are not in this process
     }
     const CancellationDisabled cancellationDisabled;
