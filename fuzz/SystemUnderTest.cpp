@@ -93,6 +93,18 @@ struct Manager {
         return manager;
     }
 
+    /** Ends the provider, and opens it again without data files. */
+    void restartWithoutFiles() {
+        {
+            cimhost::RequestScope scope(broker);
+            const CMPIContext* context = scope.context({});
+            interfaces.instances->ft->cleanup(interfaces.instances, context, 1);
+            interfaces.associations->ft->cleanup(interfaces.associations, context, 1);
+        }
+        agentEnvironment::clear();
+        interfaces = openInterfaces(broker.handle());
+    }
+
     Computers computers{};
     cimhost::Broker broker{{schemaClasses(), &computers, {}, nullptr, true}};
     Interfaces interfaces = openInterfaces(broker.handle());
@@ -156,7 +168,7 @@ const Store* storeOf(const std::string& className) {
 
 SystemUnderTest::SystemUnderTest(std::size_t computers) {
     Manager::only().computers.choose(computers);
-    agentEnvironment::clear();
+    Manager::only().restartWithoutFiles();
     restart();
 }
 
