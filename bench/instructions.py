@@ -59,17 +59,23 @@ RATIO_LIMITS = {("EnumInstances", "VELKO_Lease", 1000): 3.0}
 GATE_PART_LIMITS = {("EnumInstances", "VELKO_Lease", 1000): 0.05}
 GATE_LIMITS = {("GetInstance.middle", "VELKO_Lease", 10): 10000}
 
+# The host's objects: the baseline with the allocator that cimhost links, and the most instructions per instance.
+HOST = (ENUM, "VELKO_Lease", 1000)
+HOST_ALLOCATOR = "libjemalloc.so.2"
+HOST_LIMIT = 12000
+
 # Highest growth of the instructions per record from 1,000 to 10,000 records.
 GROWTH_LIMIT = 1.1
 
 
-def count(program, request, function):
+def count(program, request, function, preloaded=""):
     """The instructions of one request in the functions that match a pattern."""
     with tempfile.TemporaryDirectory() as directory:
         command = ["valgrind", "--tool=callgrind", "--compress-strings=no",
                    f"--callgrind-out-file={directory}/out", f"--toggle-collect={function}", str(program),
                    f"--benchmark_filter=^{re.escape(request)}/manual_time$", "--benchmark_min_time=0"]
-        done = subprocess.run(command, capture_output=True, text=True, check=False)
+        done = subprocess.run(command, env={**os.environ, "LD_PRELOAD": preloaded}, capture_output=True, text=True,
+                              check=False)
     collected = re.search(r"Collected : (\d+)", done.stderr)
     if done.returncode != 0 or collected is None or int(collected[1]) == 0:
         sys.exit(f"{request} could not be counted:\n{done.stdout}{done.stderr}")
@@ -89,10 +95,15 @@ def measure(program):
             work.append((f"{operation}/{class_name}/{side}/{size}", function))
     for (operation, _, call), class_name, size, gate in GATED:
         work += [(f"{operation}/{class_name}/gate/{size}", function) for function in (gate, call)]
+    (operation, _, call), class_name, size = HOST
+    host = (f"{operation}/{class_name}/baseline/{size}", call, HOST_ALLOCATOR)
+    work.append(host)
     with concurrent.futures.ThreadPoolExecutor(os.cpu_count()) as workers:
         numbers = workers.map(lambda one: count(program, *one), work)
         counted = dict(zip(work, numbers))
+    host_count = counted.pop(host)
     counts = {name: number for (name, _), number in counted.items()}
+    counts[f"{operation}/{class_name}/host/{size}"] = host_count
     for (operation, _, call), class_name, size, gate in GATED:
         name, baseline = (f"{operation}/{class_name}/{side}/{size}" for side in ("gate", "baseline"))
         counts[name] = added_by_gate(counted[name, gate], counted[name, call], counts[baseline])
@@ -105,6 +116,9 @@ def show(counts):
         provider, baseline = (counts[f"{operation}/{class_name}/{side}/{size}"] for side in ("provider", "baseline"))
         print(f"{f'{operation} {class_name} {size}':<52}{provider:>14,}{baseline:>14,}{provider / baseline:>8.2f}"
               f"{provider / size:>12,.1f}")
+    (operation, _, _), class_name, size = HOST
+    host = counts[f"{operation}/{class_name}/host/{size}"]
+    print(f"\nThe host's objects, {operation} {class_name} {size}: {host / size:,.0f} per instance")
     print(f"\n{'request behind the gate':<52}{'provider':>14}{'gate adds':>14}{'part':>8}")
     for (operation, _, _), class_name, size, _ in GATED:
         provider, gate = (counts[f"{operation}/{class_name}/{side}/{size}"] for side in ("provider", "gate"))
@@ -127,6 +141,10 @@ def broken_limits(counts):
         if provider > limit * baseline:
             yield f"{operation} {class_name} {size}: {provider / baseline:.2f} times the baseline; at most {limit} is allowed"
     yield from broken_gate_limits(counts)
+    (operation, _, _), class_name, size = HOST
+    host = counts[f"{operation}/{class_name}/host/{size}"] / size
+    if host > HOST_LIMIT:
+        yield f"the host's objects: {host:,.0f} instructions per instance; at most {HOST_LIMIT:,} are allowed"
     for name, number in counts.items():
         small = counts.get(name.replace("/provider/10000", "/provider/1000"))
         if name.endswith("/provider/10000") and number > GROWTH_LIMIT * 10 * small:

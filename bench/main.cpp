@@ -35,6 +35,8 @@ bool run() {
 int main(int argc, char** argv) {
     // Keep freed memory in the process; otherwise the kernel's work for it is measured with large responses.
     mallopt(M_TRIM_THRESHOLD, std::numeric_limits<int>::max());
+    // Merge freed blocks at once; otherwise some request merges those of earlier ones.
+    mallopt(M_MXFAST, 0);
     benchmark::Initialize(&argc, argv);
     if (benchmark::ReportUnrecognizedArguments(argc, argv)) {
         return 1;

@@ -52,10 +52,7 @@ CMPIInstance* newInstance(const CMPIBroker* broker, const CMPIObjectPath* path, 
 CMPIObjectPath* newObjectPath(const CMPIBroker* broker, const char* nameSpace, const char* className, CMPIStatus* rc) {
     return guarded<CMPIObjectPath*>(rc, nullptr, [&] {
         Arena& arena = arenaOf(broker);
-        ObjectPath path;
-        path.nameSpace = nameSpace == nullptr ? "" : nameSpace;
-        path.className = argument(className);
-        return arena.make<CMPIObjectPath>(std::move(path));
+        return arena.make<CMPIObjectPath>({{}, nameSpace == nullptr ? "" : nameSpace, argument(className), {}});
     });
 }
 
