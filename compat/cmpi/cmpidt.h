@@ -8,9 +8,9 @@
 #ifndef CMPIDT_H
 #define CMPIDT_H
 
-#include "cmpi20/names.h"
-
 #include <stddef.h>
+
+#include "cmpi20/names.h"
 
 #ifdef __cplusplus
 extern "C" {

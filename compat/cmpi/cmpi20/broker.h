@@ -5,10 +5,10 @@
 #ifndef CMPI20_BROKER_H
 #define CMPI20_BROKER_H
 
-#include "../cmpidt.h"
-
 #include <stddef.h>
 #include <time.h>
+
+#include "../cmpidt.h"
 
 #ifdef __cplusplus
 extern "C" {
