@@ -24,6 +24,14 @@ long long timeOfFiles() {
     return nanosecondsIn(now);
 }
 
+bool isStored(const RecordFile& file) {
+    try {
+        return file.isStored();
+    } catch (const std::system_error&) {
+        return true;  // the file or a copy, which cannot be read
+    }
+}
+
 }  // namespace
 
 bool DataDirectory::open() {
@@ -49,12 +57,8 @@ void DataDirectory::close() {
 bool DataDirectory::hasLostFiles() const {
     const std::vector<RecordFile> files = recordFilesIn(path());
     for (std::size_t index = 0; index < files.size(); ++index) {
-        try {
-            if (wereStored[index] && !files[index].isStored()) {
-                return true;
-            }
-        } catch (const std::system_error&) {
-            continue;  // there is a copy, which cannot be read
+        if (wereStored[index] && !isStored(files[index])) {
+            return true;
         }
     }
     return false;
@@ -64,6 +68,11 @@ void DataDirectory::remember(const Stamp& stamp) {
     for (std::size_t index = 0; index < stamp.size(); ++index) {
         wereStored[index] = wereStored[index] || stamp[index][1] != 0;
     }
+}
+
+bool DataDirectory::hasStored(const Stamp& stamp) const {
+    const std::vector<RecordFile> files = recordFilesIn(path());
+    return stamp != Stamp{} || std::any_of(files.begin(), files.end(), isStored);
 }
 
 bool DataDirectory::exists() const {
@@ -76,8 +85,8 @@ DataDirectory::Ownership DataDirectory::acquire() {
     const DirectoryLock::Result result = acquireLock();
     const bool isOther = result.state == DirectoryLock::State::heldByOther;
     const Stamp now = stamp();
-    // Without record files, the provider's records are the only ones.
-    hasOtherOwner = hadOtherOwner || (result.state == DirectoryLock::State::acquired && now != Stamp{});
+    // Without record files and copies, the provider's records are the only ones.
+    hasOtherOwner = hadOtherOwner || (result.state == DirectoryLock::State::acquired && hasStored(now));
     remember(now);
     return {isOwner(), isOther,
             "The data directory " + path() +

@@ -65,6 +65,9 @@ private:
     Stamp stamp() const;
     void remember(const Stamp& stamp);
 
+    /** Whether there is a record file or a copy. @param stamp the present one */
+    bool hasStored(const Stamp& stamp) const;
+
     std::string (*path)();
     void (*log)(const std::string&);
     DirectoryLock lock{};

@@ -139,6 +139,17 @@ TEST_F(TwoProcessesTest, AnOwnerThatRegainsALostLockReadsTheFilesAgain) {
     EXPECT_THAT(identifiers(), ElementsAre("L1", "L2", "L3"));
 }
 
+TEST_F(TwoProcessesTest, AnOwnerThatRegainsALostLockReadsTheSavedCopies) {
+    OtherProcess other({[&] { return create("L2").rc == CMPI_RC_OK; }});
+    create("L1");
+    std::filesystem::remove(dataFile("owner"));
+    ASSERT_TRUE(other.does(0));
+    other.end();
+    std::filesystem::remove(dataFile("Lease.dat"));
+    EXPECT_THAT(create("L3"), isAnswered(1));
+    EXPECT_THAT(identifiers(), ElementsAre("L1", "L2", "L3"));
+}
+
 TEST_F(TwoProcessesTest, TheFileOfAnEarlierOwnerLocksNothing) {
     create("L1");
     unload();
