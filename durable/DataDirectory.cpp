@@ -32,6 +32,22 @@ bool isStored(const RecordFile& file) {
     }
 }
 
+bool isIncomplete(const RecordFile& file) {
+    try {
+        return !file.isComplete(file.content().value_or(std::string()));
+    } catch (const std::system_error&) {
+        return false;  // the provider cannot read it either
+    }
+}
+
+bool needsRecovery(const RecordFile& file) {
+    try {
+        return file.needsRecovery();
+    } catch (const std::system_error&) {
+        return isIncomplete(file);  // there is a copy, which this process cannot read
+    }
+}
+
 }  // namespace
 
 bool DataDirectory::open() {
@@ -126,13 +142,7 @@ void DataDirectory::recover() const {
 
 bool DataDirectory::needRecovery() const {
     const std::vector<RecordFile> files = recordFilesIn(path());
-    return std::any_of(files.begin(), files.end(), [](const RecordFile& file) {
-        try {
-            return file.needsRecovery();
-        } catch (const std::system_error&) {
-            return false;  // it has no copy that this process can read
-        }
-    });
+    return std::any_of(files.begin(), files.end(), needsRecovery);
 }
 
 DataDirectory::Stamp DataDirectory::stamp() const {

@@ -123,6 +123,15 @@ TEST_F(DataDirectoryTest, MayNotBeReadWhileAFileIsIncompleteAndAnotherProcessIsT
     EXPECT_THAT(messages, IsEmpty());
 }
 
+TEST_F(DataDirectoryTest, MayNotBeReadWhileAFileIsIncompleteAndItsCopyCannotBeRead) {
+    std::filesystem::create_directory(file().string() + ".saved1");  // cannot be read, also by root
+    lockByOther();
+    EXPECT_TRUE(directory.open()) << "the file is complete";
+    testsupport::writeFile(file(), "1\nW1\n");
+    setAge(60);
+    EXPECT_FALSE(directory.open());
+}
+
 TEST_F(DataDirectoryTest, HasChangedForAForkedChildOfItsOwner) {
     EXPECT_TRUE(directory.open());
     testsupport::writeFile(file(), "0\n");
