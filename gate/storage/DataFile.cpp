@@ -6,11 +6,11 @@
 #include <unistd.h>
 
 #include <algorithm>
-#include <cctype>
 #include <cerrno>
 #include <filesystem>
 #include <iterator>
 #include <sstream>
+#include <string_view>
 #include <system_error>
 
 #include "KO/PlatformUtilities.h"
@@ -72,11 +72,16 @@ bool hasRoom(const std::string& directory, std::size_t growth) {
     return blocks > (growth + block) / system.f_frsize;
 }
 
-/** Whether a line of a record file is the identifier. */
+/** Whether the provider splits a record file at a character. */
+bool isSpace(char each) {
+    return std::string_view(" \t\n\v\f\r").find(each) != std::string_view::npos;
+}
+
+/** Whether a line of a record file is the identifier, and the provider reads it as one. */
 bool hasRecord(const std::string& content, std::string identifier) {
     std::replace(identifier.begin(), identifier.end(), ' ', '_');
-    const bool isLine = identifier.find('\n') == std::string::npos;
-    return isLine && ('\n' + content).find('\n' + identifier + '\n') != std::string::npos;
+    return std::none_of(identifier.begin(), identifier.end(), isSpace) &&
+           ('\n' + content).find('\n' + identifier + '\n') != std::string::npos;
 }
 
 /** Calls a function, and reports the errors of files to the client. */
@@ -130,7 +135,7 @@ bool DataFile::isStored() const {
 bool DataFile::mayHave(const std::string& content, std::string identifier) const {
     std::replace(identifier.begin(), identifier.end(), ' ', '_');
     const auto isOutside = [&](std::size_t position) {
-        return position >= content.size() || std::isspace(static_cast<unsigned char>(content[position])) != 0;
+        return position >= content.size() || isSpace(content[position]);
     };
     std::size_t found = content.find(identifier);
     while (found != std::string::npos && !(isOutside(found - 1) && isOutside(found + identifier.size()))) {
