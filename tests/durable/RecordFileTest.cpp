@@ -252,6 +252,20 @@ TEST_F(RecordFileTest, TheTargetOfASymbolicLinkIsProtected) {
     EXPECT_EQ(readFile(target), records({"W1"}));
 }
 
+TEST_F(RecordFileTest, TheCopiesOfATargetWithWordsOfTheirLastLineInItsNameAreUsed) {
+    for (const char* name : {"records before 2026", "before an unfinished change"}) {
+        fs::remove(path);
+        fs::create_symlink(in(name), path);
+        const RecordFile linked = recordFileIn(directory.withSlash(), "Warranty.dat");
+        for (const bool hasSteps : {false, true}) {
+            writeFile(path, records({"W1"}));
+            linked.prepare(records({"W1"}), hasSteps);
+            EXPECT_EQ(linked.savedCopy().content, records({"W1"})) << name;
+            EXPECT_EQ(linked.savedCopy().isUnfinished, hasSteps) << name;
+        }
+    }
+}
+
 TEST_F(RecordFileTest, WithoutAnyFileThereIsNothingToRecover) {
     EXPECT_THAT(file.recover(), IsEmpty());
     EXPECT_TRUE(fs::is_empty(directory.path()));
