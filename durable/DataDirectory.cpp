@@ -51,18 +51,24 @@ bool needsRecovery(const RecordFile& file) {
 }  // namespace
 
 bool DataDirectory::open() {
+    const bool hadOtherOwner = hasOtherOwner;
+    hasOtherOwner = true;  // if an exception leaves the question open
     acquireLock();
-    hasOtherOwner = false;
     if (isOwner()) {
         recover();
     }
     const long long now = timeOfFiles();
-    openStamp = stamp();
-    remember(openStamp);
+    const Stamp current = stamp();
+    remember(current);
     // A file that is written again at the time of its last change would seem unchanged. A later time is a wrong one.
-    const bool isSettled = std::none_of(openStamp.begin(), openStamp.end(),
+    const bool isSettled = std::none_of(current.begin(), current.end(),
                                         [&](const auto& file) { return file[2] >= now && file[2] < now + second; });
-    return isOwner() || (isSettled && !needRecovery());
+    const bool isReadable = isOwner() || (isSettled && !needRecovery());
+    if (isReadable) {
+        openStamp = current;
+    }
+    hasOtherOwner = hadOtherOwner && !isReadable;
+    return isReadable;
 }
 
 void DataDirectory::close() {

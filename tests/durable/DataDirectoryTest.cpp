@@ -108,6 +108,7 @@ TEST_F(DataDirectoryTest, MayNotBeReadWhileAFileWasJustChangedByAnotherProcess) 
     EXPECT_TRUE(directory.open());
     setAge(-0.5);
     EXPECT_FALSE(directory.open());
+    EXPECT_TRUE(directory.isOutdated()) << "until it may be read";
     setAge(-3600);
     EXPECT_TRUE(directory.open()) << "the time is wrong";
 }
