@@ -293,7 +293,7 @@ TEST_F(RecordFileTest, AnUnfinishedChangeOfAnEditedFileIsRecognized) {
 TEST_F(RecordFileTest, AnotherCompleteFileIsKeptAlthoughAChangeIsUnfinished) {
     for (const std::string& edited :
          {records({"W1"}), records({"W1", "W2", "W3"}), records({"W3", "W2"}), records({}), std::string("0"),
-          "2\nW1\nAnother\n20260101000000.000000+000\n12\nW2\n*\n*\n12\n"}) {
+          std::string("2\nW1\nAnother\n20260101000000.000000+000\n12\nW2\n*\n*\n12\n")}) {
         writeFile(path, records({"W1"}));
         prepare(true);
         writeFile(path, edited);
