@@ -94,11 +94,17 @@ int check() {
 
 int restore(const RecordClass& owner) {
     const LockedDirectory directory;
-    const std::string restored = directory.fileOf(owner).restoreSaved();
+    const durable::RecordFile file = directory.fileOf(owner);
+    const bool hasFormer = !file.content().value_or(std::string()).empty();
+    const std::string restored = file.restoreSaved();
     if (restored.empty()) {
         throw std::runtime_error(std::string(owner.fileName) + " has no complete saved copy. Nothing is changed.");
     }
-    std::cout << owner.fileName << ": " << restored << " A former file is now " << owner.fileName << ".damaged.\n";
+    std::cout << owner.fileName << ": " << restored;
+    if (hasFormer) {
+        std::cout << " The former file is now " << owner.fileName << ".damaged.";
+    }
+    std::cout << "\n";
     return exitSuccess;
 }
 

@@ -24,21 +24,51 @@ long long timeOfFiles() {
     return nanosecondsIn(now);
 }
 
+bool isStored(const RecordFile& file) {
+    try {
+        return file.isStored();
+    } catch (const std::system_error&) {
+        return true;  // the file or a copy, which cannot be read
+    }
+}
+
+bool isIncomplete(const RecordFile& file) {
+    try {
+        return !file.isComplete(file.content().value_or(std::string()));
+    } catch (const std::system_error&) {
+        return false;  // the provider cannot read it either
+    }
+}
+
+bool needsRecovery(const RecordFile& file) {
+    try {
+        return file.needsRecovery();
+    } catch (const std::system_error&) {
+        return isIncomplete(file);  // there is a copy, which this process cannot read
+    }
+}
+
 }  // namespace
 
 bool DataDirectory::open() {
+    const bool hadOtherOwner = hasOtherOwner;
+    hasOtherOwner = true;  // if an exception leaves the question open
     acquireLock();
-    hasOtherOwner = false;
     if (isOwner()) {
         recover();
     }
     const long long now = timeOfFiles();
-    openStamp = stamp();
-    remember(openStamp);
+    const Stamp current = stamp();
+    remember(current);
     // A file that is written again at the time of its last change would seem unchanged. A later time is a wrong one.
-    const bool isSettled = std::none_of(openStamp.begin(), openStamp.end(),
+    const bool isSettled = std::none_of(current.begin(), current.end(),
                                         [&](const auto& file) { return file[2] >= now && file[2] < now + second; });
-    return isOwner() || (isSettled && !needRecovery());
+    const bool isReadable = isOwner() || (isSettled && !needRecovery());
+    if (isReadable) {
+        openStamp = current;
+    }
+    hasOtherOwner = hadOtherOwner && !isReadable;
+    return isReadable;
 }
 
 void DataDirectory::close() {
@@ -49,12 +79,8 @@ void DataDirectory::close() {
 bool DataDirectory::hasLostFiles() const {
     const std::vector<RecordFile> files = recordFilesIn(path());
     for (std::size_t index = 0; index < files.size(); ++index) {
-        try {
-            if (wereStored[index] && !files[index].isStored()) {
-                return true;
-            }
-        } catch (const std::system_error&) {
-            continue;  // there is a copy, which cannot be read
+        if (wereStored[index] && !isStored(files[index])) {
+            return true;
         }
     }
     return false;
@@ -64,6 +90,11 @@ void DataDirectory::remember(const Stamp& stamp) {
     for (std::size_t index = 0; index < stamp.size(); ++index) {
         wereStored[index] = wereStored[index] || stamp[index][1] != 0;
     }
+}
+
+bool DataDirectory::hasStored(const Stamp& stamp) const {
+    const std::vector<RecordFile> files = recordFilesIn(path());
+    return stamp != Stamp{} || std::any_of(files.begin(), files.end(), isStored);
 }
 
 bool DataDirectory::exists() const {
@@ -76,8 +107,8 @@ DataDirectory::Ownership DataDirectory::acquire() {
     const DirectoryLock::Result result = acquireLock();
     const bool isOther = result.state == DirectoryLock::State::heldByOther;
     const Stamp now = stamp();
-    // Without record files, the provider's records are the only ones.
-    hasOtherOwner = hadOtherOwner || (result.state == DirectoryLock::State::acquired && now != Stamp{});
+    // Without record files and copies, the provider's records are the only ones.
+    hasOtherOwner = hadOtherOwner || (result.state == DirectoryLock::State::acquired && hasStored(now));
     remember(now);
     return {isOwner(), isOther,
             "The data directory " + path() +
@@ -117,13 +148,7 @@ void DataDirectory::recover() const {
 
 bool DataDirectory::needRecovery() const {
     const std::vector<RecordFile> files = recordFilesIn(path());
-    return std::any_of(files.begin(), files.end(), [](const RecordFile& file) {
-        try {
-            return file.needsRecovery();
-        } catch (const std::system_error&) {
-            return false;  // it has no copy that this process can read
-        }
-    });
+    return std::any_of(files.begin(), files.end(), needsRecovery);
 }
 
 DataDirectory::Stamp DataDirectory::stamp() const {

@@ -26,7 +26,7 @@ public:
 
     /**
      * Called before the provider is loaded. Acquires the lock if possible. The owner recovers the record files. Throws
-     * std::system_error if a file cannot be checked or restored.
+     * std::system_error if a file cannot be checked or restored. Unless it returns true, the provider stays outdated.
      * @return whether the files may be read now; false if they are incomplete, or another process may be writing them
      */
     bool open();
@@ -64,6 +64,9 @@ private:
     bool needRecovery() const;
     Stamp stamp() const;
     void remember(const Stamp& stamp);
+
+    /** Whether there is a record file or a copy. @param stamp the present one */
+    bool hasStored(const Stamp& stamp) const;
 
     std::string (*path)();
     void (*log)(const std::string&);

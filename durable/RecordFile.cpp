@@ -10,6 +10,7 @@
 #include <cstdint>
 #include <ctime>
 #include <iterator>
+#include <sstream>
 #include <stdexcept>
 #include <system_error>
 
@@ -34,10 +35,22 @@ std::size_t endedLinesIn(std::string_view content) {
     return static_cast<std::size_t>(std::count(content.begin(), content.end(), '\n'));
 }
 
-/** The content after the line of the count. */
-std::string_view recordsIn(std::string_view content) {
-    const std::string_view lines = withoutLeadingSpace(content);
-    return lines.substr(std::min(lines.find('\n'), lines.size() - 1) + 1);
+/** The words of a file, at which the provider splits it. */
+std::vector<std::string> wordsIn(std::string_view content) {
+    std::istringstream stream{std::string(content)};
+    return {std::istream_iterator<std::string>(stream), std::istream_iterator<std::string>()};
+}
+
+std::string withoutLeadingZeros(const std::string& word) {
+    const bool isNumber = word.find_first_not_of("0123456789", word[0] == '+' ? 1 : 0) == std::string::npos;
+    return isNumber ? word.substr(std::min(word.find_first_not_of("+0"), word.size() - 1)) : word;
+}
+
+/** Whether the provider, which has read a word, may write it as another one. */
+bool mayBecome(const std::string& read, const std::string& written) {
+    constexpr std::string_view noDate = "00000000000000.000000-000";
+    return withoutLeadingZeros(read) == withoutLeadingZeros(written) || (read.size() == 1 && written == "*") ||
+           (read.size() < noDate.size() && written == noDate);
 }
 
 bool endsWith(std::string_view content, std::string_view end) {
@@ -89,9 +102,15 @@ bool RecordFile::isComplete(std::string_view content) const {
 }
 
 bool RecordFile::addsOneRecord(std::string_view content, std::string_view former) const {
-    const std::string_view records = recordsIn(content);
-    const std::string_view before = recordsIn(former);
-    return records.substr(0, before.size()) == before && endedLinesIn(records.substr(before.size())) == lines;
+    if (former.empty()) {
+        return false;
+    }
+    const std::size_t count = promisedIn(former).value_or(0);
+    const std::vector<std::string> before = wordsIn(former);
+    const std::vector<std::string> now = wordsIn(content);
+    const std::size_t size = std::min({1 + count * lines, before.size(), now.size()});
+    const auto end = before.begin() + static_cast<std::ptrdiff_t>(size);
+    return promisedIn(content) == count + 1 && std::equal(before.begin() + 1, end, now.begin() + 1, mayBecome);
 }
 
 SavedCopies::Copy RecordFile::savedCopy() const {

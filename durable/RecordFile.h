@@ -93,7 +93,10 @@ public:
     void replace(std::string_view records) const;
 
 private:
-    /** Whether a content has the records of another one and one more at its end, as while a record is created. */
+    /**
+     * Whether a content has the records of another one and one more at its end, as while a record is created. The
+     * provider may have written the records in another form than it has read.
+     */
     bool addsOneRecord(std::string_view content, std::string_view former) const;
 
     std::string countsOf(std::string_view content) const;

@@ -37,7 +37,7 @@ SavedCopies::Copy SavedCopies::parse(std::string content) const {
     const char* number = content.data() + std::min(start + beginningOfLastLine.size(), content.size());
     Copy copy;
     std::from_chars(number, content.data() + content.size(), copy.number);
-    copy.isUnfinished = content.find(" before ", start) != std::string::npos;
+    copy.isUnfinished = content.substr(start) != lastLine(copy);
     const bool hasHoles = content.find('\0') != std::string::npos;  // left by a file system that lost power
     if (hasHoles || content.substr(start) != lastLine(copy)) {
         return {};

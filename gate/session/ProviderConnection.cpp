@@ -119,9 +119,12 @@ bool ProviderConnection::needsLoading() const {
     return isOutdated || !library.isLoaded() || theDirectory.isOutdated();
 }
 
-void ProviderConnection::requireCurrent(LockGuard& guard) {
+void ProviderConnection::requireCurrent(LockGuard& guard, bool mayBeOlder) {
     bool isWaiting = false;
     waitWhile(guard, [&] { return isWaiting = needsLoading() && (upCalls != 0 || !load()); });
+    if (isWaiting && mayBeOlder && library.isLoaded() && !isOutdated) {
+        return;
+    }
     if (isWaiting && upCalls != 0) {
         fail(CMPI_RC_ERR_FAILED, "The provider waits for the object manager and cannot be loaded again. Try again.");
     }
@@ -131,18 +134,18 @@ void ProviderConnection::requireCurrent(LockGuard& guard) {
 }
 
 /**
- * Loads the provider, which reads its files. Unloads it first if it is loaded. Returns whether the files were complete
- * and did not change meanwhile.
+ * Loads the provider, which reads its files. Unloads it first if it is loaded and the files are complete. Returns
+ * whether they are, and did not change meanwhile.
  */
 bool ProviderConnection::load() {
     if (theDirectory.hasLostFiles()) {
         fail(CMPI_RC_ERR_FAILED, "The record files were removed. Restore the data directory and try again.");
     }
+    if (!theDirectory.open()) {
+        return false;  // a request may read the older tables
+    }
     isOutdated = true;
     unload();
-    if (!theDirectory.open()) {
-        return false;
-    }
     library.load();
     shutdownAtExit.registerAgain();
     if (!theDirectory.hasChanged()) {

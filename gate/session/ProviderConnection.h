@@ -54,8 +54,9 @@ public:
      * Loads the provider if it is not loaded or outdated. Releases the lock until no other request is in an up-call of
      * the provider, since it cannot be unloaded before, and until no other process writes the files. Fails with
      * CMPI_RC_ERR_FAILED if that takes too long, or if a file was removed, whose records would be lost.
+     * @param mayBeOlder whether the provider may have older records instead if that takes too long
      */
-    void requireCurrent(LockGuard& guard);
+    void requireCurrent(LockGuard& guard, bool mayBeOlder);
 
     /** @name Whether a class's table has been compared with its file since the provider was loaded */
     bool isVerified(const Class& owner) const { return (verified & bitOf(owner)) != 0; }

@@ -65,12 +65,13 @@ void ClientRequest::give(const Paths& paths) const {
     giveAll<&CMPIResultFT::returnObjectPath>(*this, paths);
 }
 
-ProviderSession::ProviderSession(const ClientRequest& itsRequest, Access access) : request(itsRequest) {
+ProviderSession::ProviderSession(const ClientRequest& itsRequest, Access access)
+    : request(itsRequest), isReading(access == Access::read) {
     request.broker();  // there must be one
-    if (access == Access::change) {
+    if (!isReading) {
         theConnection.requireOwner(guard);
     }
-    theConnection.requireCurrent(guard);
+    theConnection.requireCurrent(guard, isReading);
 }
 
 /** Calls a function of one of the provider's interfaces. */

@@ -101,7 +101,7 @@ public:
     template <class Work>
     void releaseFor(Work work) {
         guard.releaseFor(work);
-        theConnection.requireCurrent(guard);
+        theConnection.requireCurrent(guard, isReading);
     }
 
 private:
@@ -112,6 +112,7 @@ private:
 
     LockGuard guard;
     const ClientRequest& request;
+    bool isReading;
 };
 
 }  // namespace gate

@@ -6,11 +6,11 @@
 #include <unistd.h>
 
 #include <algorithm>
-#include <cctype>
 #include <cerrno>
 #include <filesystem>
 #include <iterator>
 #include <sstream>
+#include <string_view>
 #include <system_error>
 
 #include "KO/PlatformUtilities.h"
@@ -72,11 +72,24 @@ bool hasRoom(const std::string& directory, std::size_t growth) {
     return blocks > (growth + block) / system.f_frsize;
 }
 
-/** Whether a line of a record file is the identifier. */
+/** Whether the provider splits a record file at a character. */
+bool isSpace(char each) {
+    return std::string_view(" \t\n\v\f\r").find(each) != std::string_view::npos;
+}
+
+bool isDigit(char each) {
+    return each >= '0' && each <= '9';
+}
+
+bool isDigit(char each) {
+    return each >= '0' && each <= '9';
+}
+
+/** Whether a line of a record file is the identifier, and the provider reads it as one. */
 bool hasRecord(const std::string& content, std::string identifier) {
     std::replace(identifier.begin(), identifier.end(), ' ', '_');
-    const bool isLine = identifier.find('\n') == std::string::npos;
-    return isLine && ('\n' + content).find('\n' + identifier + '\n') != std::string::npos;
+    return std::none_of(identifier.begin(), identifier.end(), isSpace) &&
+           ('\n' + content).find('\n' + identifier + '\n') != std::string::npos;
 }
 
 /** Calls a function, and reports the errors of files to the client. */
@@ -129,11 +142,14 @@ bool DataFile::isStored() const {
 
 bool DataFile::mayHave(const std::string& content, std::string identifier) const {
     std::replace(identifier.begin(), identifier.end(), ' ', '_');
-    const auto isOutside = [&](std::size_t position) {
-        return position >= content.size() || std::isspace(static_cast<unsigned char>(content[position])) != 0;
+    const auto isWord = [&](std::size_t start) {
+        const std::size_t end = start + identifier.size();
+        const bool isEnded = end == content.size() || isSpace(content[end]);
+        // A word also begins after a number that is followed by other characters.
+        return isEnded && (start == 0 || isSpace(content[start - 1]) || isDigit(content[start - 1]));
     };
     std::size_t found = content.find(identifier);
-    while (found != std::string::npos && !(isOutside(found - 1) && isOutside(found + identifier.size()))) {
+    while (found != std::string::npos && !isWord(found)) {
         found = content.find(identifier, found + 1);
     }
     return found != std::string::npos || !recordFileOf(*this).isComplete(content);

@@ -149,10 +149,12 @@ void Transaction::requireNew(const std::string& identifier, const std::string& c
     }
 }
 
-/** An existing record; null if there is none. Lists the names only if the file has lost the first record's identifier.
- */
+/** A record of the file; null if it has none. Lists the names only if it has lost the first record's identifier. */
 const CMPIInstance* Transaction::anyRecord(const std::string& content) const {
     const std::string identifier = DataFile::firstIdentifier(content);
+    if (identifier.empty()) {
+        return nullptr;
+    }
     const LocalObject first(nameSpaceOf(path.path()), owner, {{cim::findNamed(owner, identifierKey), identifier}});
     const CMPIInstance* record = session.find(first, owner);
     const Paths others = record == nullptr ? session.names(owner) : Paths();

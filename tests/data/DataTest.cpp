@@ -310,10 +310,25 @@ TEST_F(DataTest, EqualIdentifiersAreReportedAndExported) {
 
 TEST_F(DataTest, RestoreReplacesAnEditedFile) {
     writeFile(leases(), "0\n");
-    EXPECT_THAT(run("restore VELKO_Lease"), hasEnded(0, "A former file is now Lease.dat.damaged."));
+    EXPECT_THAT(run("restore VELKO_Lease"), hasEnded(0, "The former file is now Lease.dat.damaged."));
     EXPECT_EQ(readFile(leases()), content);
     EXPECT_EQ(readFile(dataFile("Lease.dat.damaged")), "0\n");
     EXPECT_THAT(identifiers(), ElementsAre("L1", "L 2"));
+}
+
+TEST_F(DataTest, RestoreOfAMissingOrEmptyFileKeepsNoFormerOne) {
+    const std::string saved = content + "saved copy 1 of Lease.dat\n";
+    removeCopies();
+    for (const bool isEmpty : {false, true}) {
+        writeFile(dataFile("Lease.dat.saved1"), saved);
+        std::filesystem::remove(leases());
+        if (isEmpty) {
+            writeFile(leases(), "");
+        }
+        EXPECT_THAT(run("restore VELKO_Lease"), hasEnded(0, "Z.\n")) << "with the time at the end";
+        EXPECT_EQ(readFile(leases()), content);
+        EXPECT_FALSE(std::filesystem::exists(dataFile("Lease.dat.damaged")));
+    }
 }
 
 TEST_F(DataTest, RestoreNeedsACompleteSavedCopy) {

@@ -108,6 +108,7 @@ TEST_F(DataDirectoryTest, MayNotBeReadWhileAFileWasJustChangedByAnotherProcess) 
     EXPECT_TRUE(directory.open());
     setAge(-0.5);
     EXPECT_FALSE(directory.open());
+    EXPECT_TRUE(directory.isOutdated()) << "until it may be read";
     setAge(-3600);
     EXPECT_TRUE(directory.open()) << "the time is wrong";
 }
@@ -121,6 +122,15 @@ TEST_F(DataDirectoryTest, MayNotBeReadWhileAFileIsIncompleteAndAnotherProcessIsT
     EXPECT_FALSE(directory.open());
     EXPECT_EQ(testsupport::readFile(file()), "1\nW1\n");
     EXPECT_THAT(messages, IsEmpty());
+}
+
+TEST_F(DataDirectoryTest, MayNotBeReadWhileAFileIsIncompleteAndItsCopyCannotBeRead) {
+    std::filesystem::create_directory(file().string() + ".saved1");  // cannot be read, also by root
+    lockByOther();
+    EXPECT_TRUE(directory.open()) << "the file is complete";
+    testsupport::writeFile(file(), "1\nW1\n");
+    setAge(60);
+    EXPECT_FALSE(directory.open());
 }
 
 TEST_F(DataDirectoryTest, HasChangedForAForkedChildOfItsOwner) {

@@ -252,6 +252,20 @@ TEST_F(RecordFileTest, TheTargetOfASymbolicLinkIsProtected) {
     EXPECT_EQ(readFile(target), records({"W1"}));
 }
 
+TEST_F(RecordFileTest, TheCopiesOfATargetWithWordsOfTheirLastLineInItsNameAreUsed) {
+    for (const char* name : {"records before 2026", "before an unfinished change"}) {
+        fs::remove(path);
+        fs::create_symlink(in(name), path);
+        const RecordFile linked = recordFileIn(directory.withSlash(), "Warranty.dat");
+        for (const bool hasSteps : {false, true}) {
+            writeFile(path, records({"W1"}));
+            linked.prepare(records({"W1"}), hasSteps);
+            EXPECT_EQ(linked.savedCopy().content, records({"W1"})) << name;
+            EXPECT_EQ(linked.savedCopy().isUnfinished, hasSteps) << name;
+        }
+    }
+}
+
 TEST_F(RecordFileTest, WithoutAnyFileThereIsNothingToRecover) {
     EXPECT_THAT(file.recover(), IsEmpty());
     EXPECT_TRUE(fs::is_empty(directory.path()));
@@ -267,9 +281,19 @@ TEST_F(RecordFileTest, AnUnfinishedChangeIsNotTakenForAnAnsweredOne) {
     EXPECT_THAT(file.recover(), IsEmpty()) << "it is finished now";
 }
 
+TEST_F(RecordFileTest, AnUnfinishedChangeOfAnEditedFileIsRecognized) {
+    const std::string edited = "\n+01\r\nW1\r\nx\r\n2026\r\n036\r\na later line\r\n";
+    writeFile(path, edited);
+    prepare(true);
+    writeFile(path, "2\nW1\n*\n00000000000000.000000-000\n36\nW2\n*\n00000000000000.000000-000\n0\n");
+    EXPECT_THAT(file.recover(), HasSubstr("held an unfinished change"));
+    EXPECT_EQ(readFile(path), edited);
+}
+
 TEST_F(RecordFileTest, AnotherCompleteFileIsKeptAlthoughAChangeIsUnfinished) {
     for (const std::string& edited :
-         {records({"W1"}), records({"W1", "W2", "W3"}), records({"W3", "W2"}), records({}), std::string("0")}) {
+         {records({"W1"}), records({"W1", "W2", "W3"}), records({"W3", "W2"}), records({}), std::string("0"),
+          std::string("2\nW1\nAnother\n20260101000000.000000+000\n12\nW2\n*\n*\n12\n")}) {
         writeFile(path, records({"W1"}));
         prepare(true);
         writeFile(path, edited);

@@ -92,7 +92,9 @@ TEST_F(LossyValuesTest, AreAcceptedIfTheConfigurationPermitsThem) {
         EXPECT_THAT(create(id, {named("Lessor", text(value))}), isAnswered(1)) << value;
         EXPECT_EQ(valueIn(instanceOf(id), "Lessor"), value);
     }
-    EXPECT_THAT(create("two\nlines"), isRefused(CMPI_RC_ERR_FAILED, "does not hold")) << "the record cannot be found";
+    for (const char* id : {"two\nlines", "a\tb", "a\vb", "a\fb", "a\rb"}) {
+        EXPECT_THAT(create(id), isRefused(CMPI_RC_ERR_FAILED, "does not hold")) << id << " shifts the fields";
+    }
     EXPECT_THAT(create("L1", {named("Lessor", text("two\nlines"))}), isAnswered(1));
     EXPECT_THAT(modify("L1", {named("LeaseTerm", uint32(3))}), isDone()) << "has too many lines";
     EXPECT_THAT(remove("L1"), isDone());

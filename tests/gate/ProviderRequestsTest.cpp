@@ -103,6 +103,10 @@ TEST_F(ProviderRequestsTest, ACreationGetsARecordThatItNeedsForComparison) {
         << "another value of the file is equal";
     EXPECT_THAT(behind([&] { return create("L2", {named("ElementName", text("Lease Information"))}); }),
                 ElementsAre("GetInstance", "CreateInstance"));
+    remove(firstNode, warranty);
+    EXPECT_THAT(behind([&] { return create("W2", {named("ElementName", text("Warranty Information"))}, warranty); }),
+                ElementsAre("CreateInstance"))
+        << "there is no other record";
     const NamedValue readOnly = named("ChangeableType", uint16(1));
     EXPECT_THAT(behindFailure(CMPI_RC_ERR_INVALID_PARAMETER, [&] { return create("L3", {readOnly}); }),
                 ElementsAre("GetInstance"));

@@ -76,6 +76,12 @@ TEST_F(RecordTest, AnExistingRecordIsNotCreatedAgain) {
     EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "ACME");
 }
 
+TEST_F(RecordTest, ARecordWhoseIdentifierFollowsANumberIsNotCreatedAgain) {
+    testsupport::writeFile(dataFile("Warranty.dat"), "1abc\nACME\n00000000000000.000000-000\n12\na later line\n");
+    EXPECT_THAT(create("abc", {}, warranty), isRefused(CMPI_RC_ERR_ALREADY_EXISTS, "abc"));
+    EXPECT_THAT(identifiers(warranty), ElementsAre("abc"));
+}
+
 TEST_F(RecordTest, ACreationStoresTheValuesAndIgnoresNulls) {
     std::vector<NamedValue> properties = allNull();
     properties[3] = named("Lessor", text("ACME Leasing"));

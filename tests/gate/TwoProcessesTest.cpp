@@ -1,8 +1,11 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include <atomic>
+#include <chrono>
 #include <functional>
 #include <stdexcept>
+#include <thread>
 
 #include "GateFixture.h"
 #include "durable/DirectoryLock.h"
@@ -91,6 +94,28 @@ TEST_F(TwoProcessesTest, AReaderIsRefusedUntilTheOwnerHasWrittenTheFile) {
     EXPECT_THAT(identifiers(), ElementsAre("L1")) << "as read before";
 }
 
+TEST_F(TwoProcessesTest, AReaderReturnsWhatItHasReadWhileTheOwnerWritesWithoutPause) {
+    OtherProcess owner({[&] { return create("L1").rc == CMPI_RC_OK; }, [&] { return create("L2").rc == CMPI_RC_OK; }});
+    ASSERT_TRUE(owner.does(0));
+    EXPECT_THAT(identifiers(), ElementsAre("L1"));
+    ASSERT_TRUE(owner.does(1));
+    std::atomic<bool> isWriting{true};
+    const auto touch = [&] {
+        constexpr auto ahead = std::chrono::milliseconds(500);
+        std::filesystem::last_write_time(dataFile("Lease.dat"), std::filesystem::file_time_type::clock::now() + ahead);
+    };
+    touch();
+    std::thread writer([&] {
+        while (isWriting) {
+            touch();
+        }
+    });
+    EXPECT_THAT(identifiers(), ElementsAre("L1"));
+    isWriting = false;
+    writer.join();
+    EXPECT_THAT(identifiers(), ElementsAre("L1", "L2"));
+}
+
 TEST_F(TwoProcessesTest, AForkedChildOfTheOwnerReadsWhatTheOwnerStores) {
     create("L1");
     OtherProcess child({[&] {
@@ -135,6 +160,17 @@ TEST_F(TwoProcessesTest, AnOwnerThatRegainsALostLockReadsTheFilesAgain) {
     std::filesystem::remove(dataFile("owner"));
     ASSERT_TRUE(other.does(0));
     other.end();
+    EXPECT_THAT(create("L3"), isAnswered(1));
+    EXPECT_THAT(identifiers(), ElementsAre("L1", "L2", "L3"));
+}
+
+TEST_F(TwoProcessesTest, AnOwnerThatRegainsALostLockReadsTheSavedCopies) {
+    OtherProcess other({[&] { return create("L2").rc == CMPI_RC_OK; }});
+    create("L1");
+    std::filesystem::remove(dataFile("owner"));
+    ASSERT_TRUE(other.does(0));
+    other.end();
+    std::filesystem::remove(dataFile("Lease.dat"));
     EXPECT_THAT(create("L3"), isAnswered(1));
     EXPECT_THAT(identifiers(), ElementsAre("L1", "L2", "L3"));
 }
