@@ -81,10 +81,6 @@ bool isDigit(char each) {
     return each >= '0' && each <= '9';
 }
 
-bool isDigit(char each) {
-    return each >= '0' && each <= '9';
-}
-
 /** Whether a line of a record file is the identifier, and the provider reads it as one. */
 bool hasRecord(const std::string& content, std::string identifier) {
     std::replace(identifier.begin(), identifier.end(), ' ', '_');
