@@ -141,6 +141,8 @@ std::optional<std::pair<int, Connection::Clock::time_point>> Connection::rank(Cl
             return std::pair{1, since};
         case Phase::idle:
             return std::pair{isTrusted ? 3 : 1, since};
+        case Phase::check:
+            return isTrusted ? std::nullopt : std::optional(std::pair{1, since});
         case Phase::body:
             return std::pair{!isTrusted ? 1 : isStalled ? 2 : 5, since};
         case Phase::response:
