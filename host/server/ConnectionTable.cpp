@@ -57,9 +57,9 @@ void Connection::trust() {
     isTrusted = true;
 }
 
-void Connection::wait(std::chrono::milliseconds time) {
+void Connection::waitUntil(Clock::time_point time) {
     std::unique_lock<std::mutex> lock(mutex);
-    ended.wait_for(lock, time, [&] { return cause != Cause::none; });
+    ended.wait_until(lock, time, [&] { return cause != Cause::none; });
 }
 
 bool Connection::hasTimedOut() const {

@@ -47,7 +47,7 @@ public:
     void trust();
 
     /** Waits, but not longer than until the connection is ended. */
-    void wait(std::chrono::milliseconds time);
+    void waitUntil(Clock::time_point time);
 
     /** Whether the table has ended it. */
     bool isEnding() const;

@@ -66,7 +66,7 @@ std::optional<HttpResponse> RequestHandler::authenticate(Exchange& exchange, con
     }
     if (*right == Right::none) {
         exchange.connection->enter(Connection::Phase::refusal);
-        exchange.connection->wait(settings.limits.failureDelay);
+        exchange.connection->waitUntil(exchange.start + settings.limits.failureDelay);
         return unauthorized();
     }
     exchange.connection->trust();

@@ -240,7 +240,7 @@ TEST_F(ConnectionTableTest, BusyConnectionsAreThoseWithARequestThatIsNotRefused)
 
 TEST_F(ConnectionTableTest, EndingAConnectionEndsItsWaitAndItsRequest) {
     Connection& connection = *add().connection;
-    std::thread waiting([&] { connection.wait(1h); });
+    std::thread waiting([&] { connection.waitUntil(Connection::Clock::now() + 1h); });
     table.endAll();
     waiting.join();
     EXPECT_FALSE(connection.enter(Phase::work));

@@ -70,6 +70,17 @@ TEST_F(RequestHandlerTest, APasswordIsCheckedOncePerConnection) {
     EXPECT_EQ(authenticator.asked, 5);
 }
 
+TEST_F(RequestHandlerTest, TheDelayAfterAWrongPasswordIncludesTheTimeOfTheCheck) {
+    settings.limits.failureDelay = std::chrono::hours(1);
+    Exchange exchange;
+    exchange.connection = &connection;
+    exchange.rules = {false, settings.limits.requestBytes};
+    exchange.start -= settings.limits.failureDelay;
+    const auto refused = handler().begin(exchange, head("EnumerateInstanceNames", wrong));
+    ASSERT_TRUE(refused);
+    EXPECT_EQ(refused->status, 401U);
+}
+
 TEST_F(RequestHandlerTest, ThePasswordOfAnEndedConnectionIsNotChecked) {
     const test::TcpPair sockets;
     ConnectionTable table(settings.limits);
