@@ -19,13 +19,15 @@ void requireKeys(const ObjectPath& path, const Schema& schema) {
     }
 }
 
-void requireRepresentable(const Response& response) {
-    for (const Instance& each : response.instances) {
-        cimxml::requireRepresentable(each);
+/** @throws CimError if XML cannot represent a result */
+ResultCursor cursorOf(Response results, ObjectForm form, InstanceParts parts = {}) {
+    for (const Instance& each : results.instances) {
+        requireRepresentable(each, parts);
     }
-    for (const ObjectPath& each : response.paths) {
-        cimxml::requireRepresentable(each);
+    for (const ObjectPath& each : results.paths) {
+        requireRepresentable(each);
     }
+    return {std::move(results), form, std::move(parts)};
 }
 
 }  // namespace
@@ -40,7 +42,6 @@ Response Operations::send(const Call& call, Request request) const {
         throw CimError(response.status);
     }
     response.providers.clear();
-    requireRepresentable(response);
     return response;
 }
 
@@ -88,7 +89,7 @@ ResultCursor Operations::enumeration(const Call& call) const {
     if (!call.arguments.flag("DeepInheritance", true)) {
         parts.onlyOf = call.schema.findClass(request.path.className);
     }
-    return {enumerate(call, std::move(request)), call.form, std::move(parts)};
+    return cursorOf(enumerate(call, std::move(request)), call.form, std::move(parts));
 }
 
 InstanceParts Operations::partsOf(const Call& call) const {
@@ -121,14 +122,15 @@ OperationResult Operations::getInstance(const Call& call) {
     const ObjectPath path = call.arguments.path("InstanceName");
     requireKeys(path, call.schema);
     requireProvider(call, path, CMPI_RC_ERR_NOT_FOUND);
-    return streamed(call, {send(call, Request::getInstance(path, parts.properties)), ObjectForm::instance, parts});
+    Response found = send(call, Request::getInstance(path, parts.properties));
+    return streamed(call, cursorOf(std::move(found), ObjectForm::instance, parts));
 }
 
 OperationResult Operations::createInstance(const Call& call) {
     const Instance instance = call.arguments.reader().instance(call.arguments.required("NewInstance"));
     requireProvider(call, instance.path, CMPI_RC_ERR_NOT_SUPPORTED);
-    ResultCursor created{send(call, Request::createInstance(instance.path, instance)), ObjectForm::instanceName};
-    return streamed(call, std::move(created));
+    Response created = send(call, Request::createInstance(instance.path, instance));
+    return streamed(call, cursorOf(std::move(created), ObjectForm::instanceName));
 }
 
 OperationResult Operations::modifyInstance(const Call& call) {
@@ -171,7 +173,7 @@ ResultCursor Operations::traversal(const Call& call, const ObjectPath& path) con
     request.path = path;
     request.filter = call.arguments.filter();
     request.properties = call.arguments.strings("PropertyList");
-    return {associate(call, std::move(request)), call.form, partsOf(call)};
+    return cursorOf(associate(call, std::move(request)), call.form, partsOf(call));
 }
 
 OperationResult Operations::traverse(const Call& call) {

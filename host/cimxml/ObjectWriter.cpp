@@ -129,10 +129,12 @@ void requireRepresentable(const ObjectPath& path) {
     }
 }
 
-void requireRepresentable(const Instance& instance) {
+void requireRepresentable(const Instance& instance, const InstanceParts& parts) {
     requireRepresentable(instance.path);
     for (const NamedValue& property : instance.properties) {
-        requireRepresentable(property.value, instance.path.className, property.name);
+        if (isWanted(property.name, parts)) {
+            requireRepresentable(property.value, instance.path.className, property.name);
+        }
     }
 }
 

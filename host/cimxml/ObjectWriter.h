@@ -79,10 +79,10 @@ private:
 std::string charactersOf(const Scalar& scalar);
 
 /**
- * Checks that XML can represent all strings of an instance or a path.
+ * Checks that XML can represent all strings of a path, or of an instance with the wanted parts.
  * @throws CimError naming class and property
  */
-void requireRepresentable(const Instance& instance);
+void requireRepresentable(const Instance& instance, const InstanceParts& parts = {});
 void requireRepresentable(const ObjectPath& path);
 
 }  // namespace cimhost::cimxml

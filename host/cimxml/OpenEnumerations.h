@@ -8,6 +8,7 @@
 #include <mutex>
 #include <optional>
 #include <string>
+#include <utility>
 
 #include "cimxml/ObjectWriter.h"
 #include "model/Response.h"
@@ -25,12 +26,14 @@ struct ResultCursor {
     std::size_t size() const { return holdsPaths() ? results.paths.size() : results.instances.size(); }
     std::size_t left() const { return size() - next; }
 
-    /** Appends the next result. */
+    /** Appends the next result, and frees it: a client that reads slowly does not hold what it has read. */
     void append(std::string& xml, const ObjectWriter& writer) {
         if (holdsPaths()) {
-            writer.append(xml, results.paths[next], form);
+            const ObjectPath path = std::move(results.paths[next]);
+            writer.append(xml, path, form);
         } else {
-            writer.append(xml, results.instances[next], form, parts);
+            const Instance instance = std::move(results.instances[next]);
+            writer.append(xml, instance, form, parts);
         }
         ++next;
     }

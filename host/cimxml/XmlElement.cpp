@@ -9,6 +9,8 @@
 #include <memory>
 #include <optional>
 
+#include "cimxml/XmlWriter.h"
+
 namespace cimhost::cimxml {
 namespace {
 
@@ -60,6 +62,9 @@ public:
         if (document.size() > static_cast<std::size_t>(std::numeric_limits<int>::max())) {
             throw XmlError("the document is too large");
         }
+        if (!isRepresentable(document)) {
+            throw XmlError("the document is not UTF-8, or has a character that XML cannot represent");
+        }
         requireFewAttributes(document);
         xmlSAXHandler events = handler();
         const std::unique_ptr<xmlParserCtxt, decltype(&xmlFreeParserCtxt)> context(
@@ -69,7 +74,8 @@ public:
         }
         parser = context.get();
         // Without XML_PARSE_NOENT, ampersands of attributes would remain encoded. There are no entities to declare.
-        xmlCtxtUseOptions(parser, XML_PARSE_NONET | XML_PARSE_NOENT);
+        // A declared encoding such as UTF-7 could hide attributes from requireFewAttributes().
+        xmlCtxtUseOptions(parser, XML_PARSE_NONET | XML_PARSE_NOENT | XML_PARSE_IGNORE_ENC);
         const int result = xmlParseChunk(parser, document.data(), static_cast<int>(document.size()), 1);
         if (refusal) {
             throw XmlError(*refusal + " (line " + std::to_string(refusedLine) + ")");

@@ -36,8 +36,8 @@ public:
 };
 
 /**
- * Parses an XML document. Only the five predefined entities and character references are expanded; nothing outside of
- * the document is read.
+ * Parses an XML document in UTF-8; the encoding that it declares is ignored. Only the five predefined entities and
+ * character references are expanded; nothing outside of the document is read.
  * @return the root element
  * @throws XmlError with the reason and the line
  */

@@ -1,6 +1,5 @@
 #include "cli/Serve.h"
 
-#include <malloc.h>
 #include <unistd.h>
 
 #include <CLI/CLI.hpp>
@@ -99,12 +98,6 @@ void announce(const std::string& message) {
     std::fflush(stdout);
 }
 
-/** Keeps freed memory for the next request instead of returning each request's memory to the system. */
-void keepFreedMemory() {
-    constexpr int kept = 64 << 20;  // bytes, for each of the allocator's arenas
-    ::mallopt(M_TRIM_THRESHOLD, kept);
-}
-
 }  // namespace
 
 CommandLineExtension ServeCommand::commandLine() {
@@ -136,7 +129,6 @@ CommandResult ServeCommand::run(ObjectManager& manager, const Arguments&, const 
     try {
         const server::Settings settings = settingsFrom(options);
         server::blockSignals();
-        keepFreedMemory();
         cimxml::Operations operations(schema, manager.registry(), manager,
                                       {hostName(), installation::version, settings.limits.enumerations});
         server::PamAuthenticator authenticator(settings.pamService);

@@ -156,7 +156,6 @@ std::optional<Credentials> credentialsFrom(const std::string& authorization) {
 }
 
 bool PamAuthenticator::accepts(const Credentials& credentials) {
-    const std::lock_guard<std::mutex> lock(mutex);
     return PamTransaction(service, directory, credentials).accepts();
 }
 

@@ -1,7 +1,6 @@
 #pragma once
 
 #include <filesystem>
-#include <mutex>
 #include <optional>
 #include <string>
 
@@ -18,14 +17,14 @@ struct Credentials {
 /** The credentials in the value of a header Authorization with the scheme Basic; none for any other value. */
 std::optional<Credentials> credentialsFrom(const std::string& authorization);
 
-/** Decides whether a password is that of a user. Called concurrently. */
+/** Decides whether a password is that of a user. Called by one thread at a time: some PAM modules need that. */
 class Authenticator {
 public:
     virtual ~Authenticator() = default;
     virtual bool accepts(const Credentials& credentials) = 0;
 };
 
-/** Authenticates users of the operating system through a PAM service. Attempts are serialised. */
+/** Authenticates users of the operating system through a PAM service. */
 class PamAuthenticator : public Authenticator {
 public:
     /** @param itsDirectory with the file of the service; empty: the system's directory */
@@ -37,7 +36,6 @@ public:
 private:
     std::string service;
     std::filesystem::path directory;
-    std::mutex mutex;  ///< some PAM modules are not safe to use from several threads
 };
 
 /** The right of an authenticated user. */

@@ -57,9 +57,9 @@ void Connection::trust() {
     isTrusted = true;
 }
 
-void Connection::wait(std::chrono::milliseconds time) {
+void Connection::waitUntil(Clock::time_point time) {
     std::unique_lock<std::mutex> lock(mutex);
-    ended.wait_for(lock, time, [&] { return cause != Cause::none; });
+    ended.wait_until(lock, time, [&] { return cause != Cause::none; });
 }
 
 bool Connection::hasTimedOut() const {
@@ -141,6 +141,8 @@ std::optional<std::pair<int, Connection::Clock::time_point>> Connection::rank(Cl
             return std::pair{1, since};
         case Phase::idle:
             return std::pair{isTrusted ? 3 : 1, since};
+        case Phase::check:
+            return isTrusted ? std::nullopt : std::optional(std::pair{1, since});
         case Phase::body:
             return std::pair{!isTrusted ? 1 : isStalled ? 2 : 5, since};
         case Phase::response:

@@ -47,7 +47,10 @@ public:
     void trust();
 
     /** Waits, but not longer than until the connection is ended. */
-    void wait(std::chrono::milliseconds time);
+    void waitUntil(Clock::time_point time);
+
+    /** Whether the table has ended it. */
+    bool isEnding() const;
 
     /** Whether it was ended because the client was too slow. */
     bool hasTimedOut() const;
@@ -70,7 +73,6 @@ private:
 
     /** Shuts the connection down, so that its thread ends it. */
     void end(Cause why);
-    bool isEnding() const;
     bool isOverdue(const Limits& limits, Clock::time_point now);
 
     /** Notes whether the client receives its response. */
@@ -97,8 +99,8 @@ private:
 /**
  * All connections. Ends those that exceed a time limit; a client without TLS that sends its body too slowly receives
  * 408. If there are too many connections, of one network or altogether, each new one ends another: first those that
- * were refused, then those that have not yet sent a request, then those whose body does not arrive, then idle ones,
- * then those that do not receive their response, at last those whose body arrives; of several the oldest.
+ * were refused, then those without an accepted password or request, then those whose body does not arrive, then idle
+ * ones, then those that do not receive their response, at last those whose body arrives; of several the oldest.
  */
 class ConnectionTable {
 public:

@@ -60,27 +60,37 @@ std::optional<HttpResponse> RequestHandler::authenticate(Exchange& exchange, con
         return unauthorized();
     }
     exchange.record.user = credentials->user;
-    const Right right = verified(exchange, *authorization);
-    if (right == Right::none) {
+    const auto right = verified(exchange, *authorization);
+    if (!right) {
+        return unavailable("The server has too many connections.");
+    }
+    if (*right == Right::none) {
         exchange.connection->enter(Connection::Phase::refusal);
-        exchange.connection->wait(settings.limits.failureDelay);
+        exchange.connection->waitUntil(exchange.start + settings.limits.failureDelay);
         return unauthorized();
     }
     exchange.connection->trust();
-    exchange.caller = {credentials->user, right == Right::write};
+    exchange.caller = {credentials->user, *right == Right::write};
     return std::nullopt;
 }
 
-/** Passwords are checked once per connection and minute, since PAM modules take long. */
-Right RequestHandler::verified(Exchange& exchange, const std::string& authorization) {
+/**
+ * Passwords are checked once per connection and minute, since PAM modules take long.
+ * @return none if the connection was ended before its turn
+ */
+std::optional<Right> RequestHandler::verified(Exchange& exchange, const std::string& authorization) {
     const Credentials credentials = *credentialsFrom(authorization);
     const auto now = std::chrono::steady_clock::now();
     Connection& connection = *exchange.connection;
     const bool isKnown = connection.authorization == authorization && now < connection.authorizedUntil;
-    if (!isKnown && !authenticator.accepts(credentials)) {
-        return Right::none;
-    }
     if (!isKnown) {
+        const std::lock_guard<std::mutex> lock(authentication);
+        if (connection.isEnding()) {
+            return std::nullopt;
+        }
+        if (!authenticator.accepts(credentials)) {
+            return Right::none;
+        }
         connection.authorization = authorization;
         connection.authorizedUntil = now + authorizationLifetime;
     }

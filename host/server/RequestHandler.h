@@ -3,6 +3,7 @@
 #include <atomic>
 #include <chrono>
 #include <memory>
+#include <mutex>
 #include <optional>
 #include <string>
 #include <variant>
@@ -73,13 +74,14 @@ public:
 private:
     std::optional<HttpResponse> check(Exchange& exchange, const HttpRequest& request);
     std::optional<HttpResponse> authenticate(Exchange& exchange, const HttpRequest& request);
-    Right verified(Exchange& exchange, const std::string& authorization);
+    std::optional<Right> verified(Exchange& exchange, const std::string& authorization);
     Reply answer(Exchange& exchange);
     Reply perform(Exchange& exchange);
 
     const Settings& settings;
     cimxml::Operations& operations;
     Authenticator& authenticator;
+    std::mutex authentication;  ///< for calls of the authenticator
     const AccessLog& accessLog;
     RequestSlots slots;
     std::atomic<bool> stopping{false};

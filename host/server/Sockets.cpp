@@ -75,7 +75,9 @@ std::uint16_t portOf(int socket) {
 std::string networkOf(const sockaddr* address) {
     if (address->sa_family == AF_INET6) {
         const auto& six = reinterpret_cast<const sockaddr_in6*>(address)->sin6_addr;
-        return {reinterpret_cast<const char*>(&six), sizeof six / 2};
+        const auto* const bytes = reinterpret_cast<const char*>(&six);
+        return IN6_IS_ADDR_V4MAPPED(&six) ? std::string(bytes + sizeof six - sizeof(in_addr), sizeof(in_addr))
+                                          : std::string(bytes, sizeof six / 2);
     }
     const auto& four = reinterpret_cast<const sockaddr_in*>(address)->sin_addr;
     return {reinterpret_cast<const char*>(&four), sizeof four};

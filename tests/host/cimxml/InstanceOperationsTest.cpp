@@ -153,6 +153,19 @@ TEST_F(InstanceOperationsTest, CharactersThatXmlLacksFailTheRequest) {
     EXPECT_THAT(*result.child("ERROR")->attribute("DESCRIPTION"), HasSubstr("Base.Text"));
 }
 
+TEST_F(InstanceOperationsTest, CharactersOfPropertiesThatTheClientDoesNotWantAreNoError) {
+    manager.answer = [](const Request& request) {
+        return Response::ofInstances({instanceOf(request.path.className, "a", {{"Text", Value::of("b\x01")}})});
+    };
+    const std::string path = parameter("InstanceName", instanceName("Base", "a"));
+    EXPECT_EQ(statusOf(response("GetInstance", path + properties({"Name"}))), 0);
+    EXPECT_EQ(statusOf(response("GetInstance", path + properties({"name", "text"}))), CMPI_RC_ERR_FAILED);
+    const std::string base = className("ClassName", "Base");
+    EXPECT_EQ(statusOf(response("EnumerateInstances", base + value("DeepInheritance", "FALSE"))), 0);
+    EXPECT_EQ(statusOf(response("EnumerateInstances", base)), CMPI_RC_ERR_FAILED);
+    EXPECT_EQ(statusOf(response("OpenEnumerateInstances", base)), CMPI_RC_ERR_FAILED);
+}
+
 TEST_F(InstanceOperationsTest, ErrorsHaveTheCodeAndMessageOfTheProvider) {
     manager.answer = [](const Request&) { return Response::failed({CMPI_RC_ERR_NOT_FOUND, "no <a> \x02"}); };
     const XmlElement result = response("GetInstance", parameter("InstanceName", instanceName("Base", "a")));

@@ -104,6 +104,22 @@ TEST_F(PullOperationsTest, LimitsAndUnsupportedOptionsHaveTheirStatus) {
               CMPI_RC_ERR_INVALID_PARAMETER);
 }
 
+TEST(ResultCursorTest, AResultIsFreedWhenItIsWritten) {
+    const ObjectWriter writer("host", "root/test");
+    ResultCursor instances{Response::ofInstances({instanceOf("Other", "a"), instanceOf("Other", "b")})};
+    std::string xml;
+    instances.append(xml, writer);
+    EXPECT_EQ(instances.results.instances[0].properties.capacity(), 0U);
+    EXPECT_EQ(instances.results.instances[0].path.keys.capacity(), 0U);
+    EXPECT_EQ(instances.results.instances[1].properties.size(), 1U);
+    ResultCursor paths{Response::ofPaths({pathOf("Other", "a"), pathOf("Other", "b")}), ObjectForm::instanceName};
+    paths.append(xml, writer);
+    EXPECT_EQ(paths.results.paths[0].keys.capacity(), 0U);
+    paths.append(xml, writer);
+    EXPECT_EQ(paths.left(), 0U);
+    EXPECT_THAT(xml, testing::HasSubstr(">b<"));
+}
+
 TEST(OpenEnumerationsTest, EnumerationsExpireAfterTheirTimeout) {
     OpenEnumerations enumerations({});
     const auto start = OpenEnumerations::Clock::now();

@@ -30,8 +30,20 @@ TEST(XmlElementTest, ElementsHaveAttributesChildrenAndCharacters) {
     EXPECT_EQ(root.child("D"), nullptr);
 }
 
-TEST(XmlElementTest, CharactersOfOtherEncodingsBecomeUtf8) {
-    EXPECT_EQ(parseXml("<?xml version=\"1.0\" encoding=\"ISO-8859-1\"?><A>\xE4</A>").characters, "\xC3\xA4");
+TEST(XmlElementTest, DocumentsAreUtf8WhateverTheyDeclare) {
+    const std::string latin = "<?xml version=\"1.0\" encoding=\"ISO-8859-1\"?>";
+    EXPECT_EQ(parseXml(latin + "<A>\xC3\xA4</A>").characters, "\xC3\xA4");
+    EXPECT_THAT(reasonFor(latin + "<A>\xE4</A>"), HasSubstr("not UTF-8"));
+    // In UTF-7, this is an element with an attribute.
+    EXPECT_NE(reasonFor("<?xml version=\"1.0\" encoding=\"UTF-7\"?><A X+AD0-'1'/>"), "accepted");
+}
+
+TEST(XmlElementTest, EncodingsThatTheFirstBytesShowAreRefused) {
+    using namespace std::string_literals;
+    for (const std::string& utf16 : {"\xFF\xFE<\0A\0/\0>\0"s, "<\0?\0x\0m\0l\0"s, "\xFE\xFF\0<\0A\0/\0>"s}) {
+        EXPECT_THAT(reasonFor(utf16), HasSubstr("not UTF-8"));
+    }
+    EXPECT_EQ(parseXml("\xEF\xBB\xBF<A/>").name, "A");
 }
 
 TEST(XmlElementTest, MalformedDocumentsAreRefusedWithTheLine) {

@@ -77,6 +77,16 @@ TEST_F(ConnectionTableTest, RefusedClientsAreEndedFirst) {
     EXPECT_TRUE(silent.isOpen() && trusted.isOpen());
 }
 
+TEST_F(ConnectionTableTest, ClientsWhosePasswordIsCheckedAreEndedUnlessAnEarlierOneWasAccepted) {
+    const Added& trusted = addIn(Phase::check, true);
+    const Added& stranger = addIn(Phase::check);
+    addIn(Phase::work);
+    add().connection->enter(Phase::work);
+    EXPECT_FALSE(stranger.isOpen());
+    EXPECT_TRUE(stranger.connection->isEnding());
+    EXPECT_TRUE(trusted.isOpen());
+}
+
 TEST_F(ConnectionTableTest, IdleConnectionsAreEndedBeforeThoseWithABody) {
     const Added& body = addIn(Phase::body, true);
     const Added& idle = addIn(Phase::idle, true);
@@ -91,7 +101,7 @@ TEST_F(ConnectionTableTest, IdleConnectionsAreEndedBeforeThoseWithABody) {
 TEST_F(ConnectionTableTest, OperationsAndResponsesInProgressAreNotEnded) {
     limits.connectionsPerAddress = 10;
     addIn(Phase::work);
-    addIn(Phase::check);
+    addIn(Phase::check, true);
     addIn(Phase::response);
     EXPECT_TRUE(add().isOpen());
     for (const Added& each : all) {
@@ -230,7 +240,7 @@ TEST_F(ConnectionTableTest, BusyConnectionsAreThoseWithARequestThatIsNotRefused)
 
 TEST_F(ConnectionTableTest, EndingAConnectionEndsItsWaitAndItsRequest) {
     Connection& connection = *add().connection;
-    std::thread waiting([&] { connection.wait(1h); });
+    std::thread waiting([&] { connection.waitUntil(Connection::Clock::now() + 1h); });
     table.endAll();
     waiting.join();
     EXPECT_FALSE(connection.enter(Phase::work));

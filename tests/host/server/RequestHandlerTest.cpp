@@ -2,6 +2,7 @@
 #include <gtest/gtest.h>
 
 #include "ServerFixture.h"
+#include "TcpPair.h"
 #include "server/RequestHandler.h"
 
 using namespace cimhost;
@@ -67,6 +68,31 @@ TEST_F(RequestHandlerTest, APasswordIsCheckedOncePerConnection) {
     list(wrong);
     list(wrong);
     EXPECT_EQ(authenticator.asked, 5);
+}
+
+TEST_F(RequestHandlerTest, TheDelayAfterAWrongPasswordIncludesTheTimeOfTheCheck) {
+    settings.limits.failureDelay = std::chrono::hours(1);
+    Exchange exchange;
+    exchange.connection = &connection;
+    exchange.rules = {false, settings.limits.requestBytes};
+    exchange.start -= settings.limits.failureDelay;
+    const auto refused = handler().begin(exchange, head("EnumerateInstanceNames", wrong));
+    ASSERT_TRUE(refused);
+    EXPECT_EQ(refused->status, 401U);
+}
+
+TEST_F(RequestHandlerTest, ThePasswordOfAnEndedConnectionIsNotChecked) {
+    const test::TcpPair sockets;
+    ConnectionTable table(settings.limits);
+    Connection* ended = table.add(sockets.server.get(), false);
+    table.endAll();
+    Exchange exchange;
+    exchange.connection = ended;
+    exchange.rules = {false, settings.limits.requestBytes};
+    const auto refused = handler().begin(exchange, head("EnumerateInstanceNames", reader));
+    ASSERT_TRUE(refused);
+    EXPECT_EQ(refused->status, 503U);
+    EXPECT_EQ(authenticator.asked, 0);
 }
 
 TEST_F(RequestHandlerTest, ARefusalDoesNotWaitForTheBody) {
