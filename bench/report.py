@@ -130,10 +130,10 @@ def memory_table(results):
     """Returns the memory per record. The table reserves room for more records, whose pages are not in use."""
     rows = []
     for class_name, size, one in memories(results):
-        memory, text, pieces = one["bytes_per_record"], one["text_per_record"], one["pieces_per_record"]
+        memory, stored, pieces = one["bytes_per_record"], one["file_per_record"], one["pieces_per_record"]
         record = memory - pieces
-        cells = (text, memory, record, pieces, one["table_per_record"] - record)
-        rows.append([class_name, f"{size:,}", *(f"{cell:.0f}" for cell in cells), f"{memory / text:.2f}"])
+        cells = (stored, memory, record, pieces, one["table_per_record"] - record)
+        rows.append([class_name, f"{size:,}", *(f"{cell:.0f}" for cell in cells), f"{memory / stored:.2f}"])
     return table(["Class", "Records", "Bytes per record in the file", "in memory", "of that the record",
                   "of that its strings", "also reserved", "Ratio of memory to file"], rows)
 
@@ -169,7 +169,7 @@ def limits_of(cases, results):
                      f"{bound}; the baseline: {growth(leases[operation], 'baseline'):.2f}")
                for what, operation, bound in LARGEST]
     limits += [Limit(f"Memory of {class_name} among 10,000, relative to its size in the file",
-                     one["bytes_per_record"] / one["text_per_record"], 2,
+                     one["bytes_per_record"] / one["file_per_record"], 2,
                      "the record layout, and one allocation per longer string", False)
                for class_name, size, one in memories(results) if size == 10000]
     limits += [Limit("Gate, enumerating 1,000 leases: added time in percent", 100 * gated, 5,
