@@ -28,23 +28,22 @@ std::optional<int> number(std::string_view digits) {
     return value;
 }
 
-/** Whether a string consists of fields of these widths: digits up to some field, asterisks from there on. */
-bool areFields(std::string_view string, std::initializer_list<std::size_t> widths) {
-    bool known = true;
-    for (const std::size_t width : widths) {
-        const std::string_view field = string.substr(0, width);
-        string.remove_prefix(width);
-        known = known && !all(field, '*');
-        if (known ? !std::all_of(field.begin(), field.end(), isDigit) : !all(field, '*')) {
-            return false;
-        }
+std::size_t digitCount(std::string_view string) {
+    std::size_t count = 0;
+    while (count < string.size() && isDigit(string[count])) {
+        ++count;
     }
-    return true;
+    return count;
+}
+
+/** Whether a string has digits up to the end of some field, and asterisks from there on. */
+bool areFields(std::string_view string, std::initializer_list<std::size_t> ends) {
+    const std::size_t known = digitCount(string);
+    return all(string.substr(known), '*') && (known == 0 || std::find(ends.begin(), ends.end(), known) != ends.end());
 }
 
 bool isFraction(std::string_view digits) {
-    const auto end = std::find_if_not(digits.begin(), digits.end(), isDigit);
-    return all(digits.substr(static_cast<std::size_t>(end - digits.begin())), '*');
+    return all(digits.substr(digitCount(digits)), '*');
 }
 
 bool within(std::string_view digits, int lowest, int highest) {
@@ -59,7 +58,7 @@ int daysIn(int month, int year) {
 }
 
 bool isDate(std::string_view string) {
-    if (!areFields(string, {4, 2, 2, 2, 2, 2}) || !within(string.substr(4, 2), 1, 12)) {
+    if (!areFields(string.substr(0, 14), {4, 6, 8, 10, 12, 14}) || !within(string.substr(4, 2), 1, 12)) {
         return false;
     }
     const std::optional<int> year = number(string.substr(0, 4));
@@ -83,7 +82,7 @@ bool isDateTime(std::string_view string) {
     }
     const std::string_view offset = string.substr(22);
     if (string[21] == ':') {
-        return offset == "000" && areFields(string, {8, 2, 2, 2}) && isTimeOfDay(string.substr(8));
+        return offset == "000" && areFields(string.substr(0, 14), {8, 10, 12, 14}) && isTimeOfDay(string.substr(8));
     }
     return (string[21] == '+' || string[21] == '-') && std::all_of(offset.begin(), offset.end(), isDigit) &&
            isDate(string) && isTimeOfDay(string.substr(8));

@@ -21,6 +21,14 @@ std::string foldedName(std::string_view name) {
     return folded;
 }
 
+std::size_t NameHash::operator()(std::string_view name) const {
+    std::size_t hash = 0;
+    for (const char c : name) {
+        hash = hash * 31 + static_cast<unsigned char>(lower(c));
+    }
+    return hash;
+}
+
 bool NameLess::operator()(std::string_view left, std::string_view right) const {
     return std::lexicographical_compare(left.begin(), left.end(), right.begin(), right.end(),
                                         [](char a, char b) { return lower(a) < lower(b); });

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <algorithm>
+#include <cstddef>
 #include <iterator>
 #include <string>
 #include <string_view>
@@ -29,6 +30,15 @@ auto* findNamed(Elements& elements, std::string_view name) {
 
 /** The name in lower case, for use as a key. */
 std::string foldedName(std::string_view name);
+
+/** Hash of a name that ignores letter case. */
+struct NameHash {
+    std::size_t operator()(std::string_view name) const;
+};
+
+struct NameEqual {
+    bool operator()(std::string_view left, std::string_view right) const { return sameName(left, right); }
+};
 
 /** Order of names that ignores letter case. */
 struct NameLess {

@@ -46,6 +46,16 @@ void writeIfAdmitted(const Record& record) noexcept {
     }
 }
 
+/** Whether a channel admits records of this level; true if that cannot be determined. */
+bool mayAdmit(const std::string& logger, int level) noexcept {
+    const PreserveErrno preserveErrno;
+    try {
+        return level <= levelsOf(logger).highest();
+    } catch (...) {
+        return true;
+    }
+}
+
 }  // namespace
 
 void RZLogger::logLevelMessage(const char* function, const char* file, int line, const std::string& logger, int level,
@@ -59,15 +69,7 @@ void RZLogger::traceLevelMessage(const char* function, const char* file, int lin
 }
 
 bool RZLogger::admits(const std::string& logger, int level) noexcept {
-    if (level > highestLevel()) {  // the usual case: most records are not written
-        return false;
-    }
-    const PreserveErrno preserveErrno;
-    try {
-        return level <= levelsOf(logger).highest();
-    } catch (...) {
-        return true;
-    }
+    return level <= highestLevel() && mayAdmit(logger, level);  // most records end at the first comparison
 }
 
 }  // namespace RZLog

@@ -1,6 +1,6 @@
 #include "broker/ClassInfo.h"
 
-#include <map>
+#include <unordered_map>
 #include <utility>
 
 #include "cim/Names.h"
@@ -26,7 +26,7 @@ std::shared_ptr<const ClassInfo> infoOf(const Schema& schema, const Class& known
 }  // namespace
 
 ClassInfoLookup classInfos(const Schema& schema) {
-    std::map<std::string, std::shared_ptr<const ClassInfo>, cim::NameLess> infos;
+    std::unordered_map<std::string, std::shared_ptr<const ClassInfo>, cim::NameHash, cim::NameEqual> infos;
     for (const Class* known : schema.classes()) {
         infos.emplace(known->name, infoOf(schema, *known));
     }

@@ -22,18 +22,25 @@ bool accepts(const InstanceContent& instance, std::string_view name) {
            std::any_of(list->begin(), list->end(), [&](const std::string& each) { return cim::sameName(each, name); });
 }
 
-/** @throws Failure if the class is known and does not have the property, or has it with another type */
-void checkAgainstClass(const ClassInfo* classInfo, std::string_view name, const Value& value) {
-    if (classInfo == nullptr) {
-        return;
+/** The declaration of a property. Providers usually set properties in the order of the class. */
+const PropertyInfo& declarationOf(const InstanceContent& target, std::string_view name) {
+    const auto& properties = target.classInfo->properties;
+    if (target.unset < properties.size() && cim::sameName(properties[target.unset].name, name)) {
+        return properties[target.unset];
     }
-    const PropertyInfo* property = findNamed(classInfo->properties, name);
+    const PropertyInfo* property = findNamed(properties, name);
     if (property == nullptr) {
-        throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY, classInfo->name + " has no property " + std::string(name) + ".");
+        throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY,
+                      target.classInfo->name + " has no property " + std::string(name) + ".");
     }
+    return *property;
+}
+
+/** @throws Failure if the value has another type than the property */
+void checkType(const InstanceContent& target, const PropertyInfo& property, const Value& value) {
     const bool isUntypedNull = value.isNull && value.type == CMPI_null;
-    if (!isUntypedNull && (value.type != property->type || value.isArray != property->isArray)) {
-        throw Failure(CMPI_RC_ERR_TYPE_MISMATCH, classInfo->name + "." + std::string(name) + " has another type.");
+    if (!isUntypedNull && (value.type != property.type || value.isArray != property.isArray)) {
+        throw Failure(CMPI_RC_ERR_TYPE_MISMATCH, target.classInfo->name + "." + property.name + " has another type.");
     }
 }
 
@@ -48,6 +55,32 @@ void removeInitial(InstanceContent& target, std::vector<NamedValue>& values, std
     }
 }
 
+/** Sets a property of a class that is not known. */
+void setUnchecked(InstanceContent& target, std::string_view name, Value&& value) {
+    if (accepts(target, name)) {
+        setNamed(target.value.writable().properties, name, std::move(value));
+    }
+}
+
+/** Sets a property as the class declares it. @throws Failure if the class does not */
+void setDeclared(InstanceContent& target, std::string_view name, Value&& value) {
+    const PropertyInfo& property = declarationOf(target, name);
+    checkType(target, property, value);
+    if (!accepts(target, name)) {
+        return;
+    }
+    const auto position = static_cast<std::size_t>(&property - target.classInfo->properties.data());
+    std::vector<NamedValue>& values = target.value.writable().properties;
+    if (property.isKey) {
+        removeInitial(target, values, name);
+    }
+    if (position < target.unset) {
+        return setNamed(values, name, std::move(value));
+    }
+    values.emplace_back(std::string(name), std::move(value));
+    target.unset = position + 1;
+}
+
 CMPIStatus setProperty(const CMPIInstance* instance, const char* name, const CMPIValue* value, CMPIType type) {
     return guarded([&] {
         InstanceContent& target = content(instance);
@@ -56,11 +89,10 @@ CMPIStatus setProperty(const CMPIInstance* instance, const char* name, const CMP
             throw Failure(CMPI_RC_ERR_INVALID_PARAMETER);
         }
         Value converted = valueFrom(value, type);
-        checkAgainstClass(target.classInfo.get(), property, converted);
-        if (accepts(target, property)) {
-            std::vector<NamedValue>& values = target.value.writable().properties;
-            removeInitial(target, values, property);
-            setNamed(values, property, std::move(converted));
+        if (target.classInfo == nullptr) {
+            setUnchecked(target, property, std::move(converted));
+        } else {
+            setDeclared(target, property, std::move(converted));
         }
     });
 }

@@ -52,6 +52,7 @@ struct InstanceContent {
     PropertyList accepted{};                       ///< the property filter; none accepts every property
     bool filtersKeys = false;                      ///< whether the filter also applies to keys
     std::size_t initialCount = 0;                  ///< number of properties, all at the front, that the broker added
+    std::size_t unset = 0;  ///< position in the class from which on no property has been set; unused without class
 };
 
 /** Content of a CMPIArray: elements of one type. */

@@ -15,32 +15,34 @@
 namespace cimhost::cimxml {
 namespace {
 
-template <class Number>
-std::string digitsOf(Number number) {
-    std::array<char, 64> digits{};
-    return {digits.data(), std::to_chars(digits.data(), digits.data() + digits.size(), number).ptr};
-}
+/** Appends the characters of a simple value; nothing for null, references and embedded instances. */
+struct CharacterWriter {
+    std::string& xml;
 
-struct Characters {
-    std::string operator()(std::monostate) const { return {}; }
-    std::string operator()(bool value) const { return value ? "TRUE" : "FALSE"; }
-    std::string operator()(Char16 character) const {
+    void operator()(std::monostate) const {}
+    void operator()(bool value) const { xml += value ? "TRUE" : "FALSE"; }
+    void operator()(Char16 character) const { appendEscaped(xml, utf8Of(character)); }
+    void operator()(const std::string& string) const { appendEscaped(xml, string); }
+    void operator()(const DateTime& dateTime) const { appendEscaped(xml, dateTime.value); }
+    void operator()(const std::shared_ptr<const ObjectPath>&) const {}
+    void operator()(const std::shared_ptr<const Instance>&) const {}
+    template <class Number>
+    void operator()(Number number) const {
+        if constexpr (std::is_floating_point_v<Number>) {
+            if (!std::isfinite(number)) {
+                xml += std::isnan(number) ? "NaN" : number < 0 ? "-INF" : "INF";
+                return;
+            }
+        }
+        std::array<char, 64> digits{};
+        const auto written = std::to_chars(digits.data(), digits.data() + digits.size(), number);
+        xml.append(digits.data(), written.ptr);
+    }
+
+    static std::string utf8Of(Char16 character) {
         std::string string;
         cim::appendUtf8(string, cim::isCodePoint(character.code) ? character.code : 0xFFFD);
         return string;
-    }
-    std::string operator()(const std::string& string) const { return string; }
-    std::string operator()(const DateTime& dateTime) const { return dateTime.value; }
-    std::string operator()(const std::shared_ptr<const ObjectPath>&) const { return {}; }
-    std::string operator()(const std::shared_ptr<const Instance>&) const { return {}; }
-    template <class Number>
-    std::string operator()(Number number) const {
-        if constexpr (std::is_floating_point_v<Number>) {
-            if (!std::isfinite(number)) {
-                return std::isnan(number) ? "NaN" : number < 0 ? "-INF" : "INF";
-            }
-        }
-        return digitsOf(number);
     }
 };
 
@@ -60,12 +62,13 @@ const char* valueTypeOf(CMPIType type) {
                                                                            : "string";
 }
 
+bool isInList(const std::vector<std::string>& names, const std::string& name) {
+    return std::any_of(names.begin(), names.end(), [&](const std::string& each) { return cim::sameName(each, name); });
+}
+
 bool isWanted(const std::string& name, const InstanceParts& parts) {
-    if (parts.onlyOf != nullptr && parts.onlyOf->findProperty(name) == nullptr) {
-        return false;
-    }
-    return !parts.properties || std::any_of(parts.properties->begin(), parts.properties->end(),
-                                            [&](const std::string& each) { return cim::sameName(each, name); });
+    return (parts.onlyOf == nullptr || parts.onlyOf->findProperty(name) != nullptr) &&
+           (!parts.properties || isInList(*parts.properties, name));
 }
 
 /** The element of a property that is not a reference, and its type in CIM-XML. */
@@ -75,6 +78,17 @@ const char* elementOf(const Value& value) {
 
 std::string_view xmlType(CMPIType type) {
     return type == CMPI_instance || type == CMPI_null ? std::string_view("string") : typeName(type);
+}
+
+/** The element of a value. References have their own elements, and null has none. */
+std::string_view elementOfContent(const Value& value) {
+    if (value.isNull) {
+        return {};
+    }
+    if (value.isArray) {
+        return value.type == CMPI_ref ? "VALUE.REFARRAY" : "VALUE.ARRAY";
+    }
+    return value.type == CMPI_ref ? "" : "VALUE";
 }
 
 std::string startTagOf(const NamedValue& property, const Property* declared) {
@@ -94,34 +108,40 @@ std::string startTagOf(const NamedValue& property, const Property* declared) {
     return xml;
 }
 
-bool isRepresentable(const Scalar& scalar) {
-    if (const auto* string = std::get_if<std::string>(&scalar)) {
-        return cimxml::isRepresentable(*string);
-    }
-    const bool isShort = std::holds_alternative<Char16>(scalar) || std::holds_alternative<DateTime>(scalar);
-    return !isShort || cimxml::isRepresentable(charactersOf(scalar));
+/** References and embedded instances have elements inside of their value. */
+bool isSimple(const Value& value) {
+    return value.type != CMPI_ref && value.type != CMPI_instance;
 }
+
+/** Whether XML can represent a scalar. Checks the objects in it. @throws CimError for them */
+struct ScalarCheck {
+    bool operator()(const std::string& string) const { return isRepresentable(string); }
+    bool operator()(const DateTime& dateTime) const { return isRepresentable(dateTime.value); }
+    bool operator()(Char16 character) const { return isRepresentable(CharacterWriter::utf8Of(character)); }
+    bool operator()(const std::shared_ptr<const ObjectPath>& path) const {
+        cimxml::requireRepresentable(*path);
+        return true;
+    }
+    bool operator()(const std::shared_ptr<const Instance>& instance) const {
+        cimxml::requireRepresentable(*instance);
+        return true;
+    }
+    template <class Plain>
+    bool operator()(const Plain&) const {
+        return true;
+    }
+};
 
 void requireRepresentable(const Value& value, const std::string& className, const std::string& name) {
     for (const Scalar& scalar : value.elements()) {
-        if (!isRepresentable(scalar)) {
+        if (!std::visit(ScalarCheck{}, scalar)) {
             throw CimError(CMPI_RC_ERR_FAILED,
                            "The value of " + className + "." + name + " has a character that XML cannot represent.");
-        }
-        if (const ObjectPath* path = referenceIn(scalar)) {
-            cimxml::requireRepresentable(*path);
-        }
-        if (const Instance* instance = instanceIn(scalar)) {
-            cimxml::requireRepresentable(*instance);
         }
     }
 }
 
 }  // namespace
-
-std::string charactersOf(const Scalar& scalar) {
-    return std::visit(Characters{}, scalar);
-}
 
 void requireRepresentable(const ObjectPath& path) {
     for (const NamedValue& key : path.keys) {
@@ -170,40 +190,69 @@ void ObjectWriter::appendInstance(std::string& xml, const Instance& instance, co
     std::size_t position = 0;
     for (const NamedValue& property : instance.properties) {
         if (isWanted(property.name, parts)) {
-            xml += startTag(property, known != nullptr ? known->findProperty(property.name) : nullptr, position++);
-            appendValue(xml, property.value);
-            appendEndTag(xml, elementOf(property.value));
+            appendProperty(xml, property, known != nullptr ? known->findProperty(property.name) : nullptr, position++);
         }
     }
 }
 
-const std::string& ObjectWriter::startTag(const NamedValue& property, const Property* declared,
-                                          std::size_t position) const {
-    if (position == startTags.size()) {
-        startTags.emplace_back();
-    }
-    StartTag& tag = startTags[position];
+void ObjectWriter::appendProperty(std::string& xml, const NamedValue& property, const Property* declared,
+                                  std::size_t position) const {
     const Value& value = property.value;
-    const bool isSame = tag.name == property.name && tag.type == value.type && tag.isArray == value.isArray &&
-                        tag.declared == declared && !tag.xml.empty();
-    if (!isSame) {
-        tag = {property.name, value.type, value.isArray, declared, startTagOf(property, declared)};
+    if (!isSimple(value)) {
+        xml += startTagOf(property, declared);
+        appendValue(xml, value);
+        return appendEndTag(xml, elementOf(value));
     }
-    return tag.xml;
+    const Tags& tags = tagsFrom(ofProperties, position, property, declared, [&](Tags& made) {
+        const std::string_view content = elementOfContent(value);
+        made.start = startTagOf(property, declared);
+        if (!content.empty()) {
+            appendStartTag(made.start, content, [] {});
+            appendEndTag(made.end, content);
+        }
+        appendEndTag(made.end, elementOf(value));
+    });
+    xml += tags.start;
+    appendContent(xml, value);
+    xml += tags.end;
+}
+
+template <class Make>
+const ObjectWriter::Tags& ObjectWriter::tagsFrom(TagsByPosition& known, std::size_t position, const NamedValue& named,
+                                                 const Property* declared, Make make) {
+    known.resize(std::max(known.size(), position + 1));
+    Tags& tags = known[position];
+    const Value& value = named.value;
+    const bool areSame = tags.name == named.name && tags.type == value.type && tags.isArray == value.isArray &&
+                         tags.isNull == value.isNull && tags.declared == declared && !tags.start.empty();
+    if (!areSame) {
+        tags = {named.name, value.type, value.isArray, value.isNull, declared};
+        make(tags);
+    }
+    return tags;
 }
 
 void ObjectWriter::appendValue(std::string& xml, const Value& value) const {
-    if (value.isNull) {
-        return;
+    const std::string_view name = elementOfContent(value);
+    if (name.empty()) {
+        return appendContent(xml, value);
     }
+    const Element element(xml, name);
+    appendContent(xml, value);
+}
+
+/** Appends what is inside the element of the value. */
+void ObjectWriter::appendContent(std::string& xml, const Value& value) const {
     if (!value.isArray) {
         return appendScalar(xml, value.single);
     }
-    const Element array(xml, value.type == CMPI_ref ? "VALUE.REFARRAY" : "VALUE.ARRAY");
-    for (const Scalar& each : value.elements()) {
+    for (const Scalar& each : value.items) {
         if (std::holds_alternative<std::monostate>(each)) {
             const Element null(xml, "VALUE.NULL");
+        } else if (referenceIn(each) != nullptr) {
+            appendScalar(xml, each);
         } else {
+            const Element element(xml, "VALUE");
             appendScalar(xml, each);
         }
     }
@@ -213,16 +262,12 @@ void ObjectWriter::appendScalar(std::string& xml, const Scalar& scalar) const {
     if (const ObjectPath* path = referenceIn(scalar)) {
         return appendReference(xml, *path);
     }
-    const Element value(xml, "VALUE");
     if (const Instance* instance = instanceIn(scalar)) {
         std::string embedded;
         appendInstance(embedded, *instance);
         return appendEscaped(xml, embedded);
     }
-    if (const auto* string = std::get_if<std::string>(&scalar)) {
-        return appendEscaped(xml, *string);
-    }
-    appendEscaped(xml, charactersOf(scalar));
+    std::visit(CharacterWriter{xml}, scalar);
 }
 
 void ObjectWriter::appendReference(std::string& xml, const ObjectPath& path) const {
@@ -237,22 +282,32 @@ void ObjectWriter::appendReference(std::string& xml, const ObjectPath& path) con
 
 void ObjectWriter::appendInstanceName(std::string& xml, const ObjectPath& path) const {
     const Element name(xml, "INSTANCENAME", [&] { appendAttribute(xml, "CLASSNAME", path.className); });
+    std::size_t position = 0;
     for (const NamedValue& key : path.keys) {
-        appendKey(xml, key);
+        appendKey(xml, key, position++);
     }
 }
 
-void ObjectWriter::appendKey(std::string& xml, const NamedValue& key) const {
-    const Element binding(xml, "KEYBINDING", [&] { appendAttribute(xml, "NAME", key.name); });
-    const Scalar& value = key.value.single;
-    if (const ObjectPath* path = referenceIn(value)) {
-        return appendReference(xml, *path);
+void ObjectWriter::appendKey(std::string& xml, const NamedValue& key, std::size_t position) const {
+    const auto appendBinding = [&](std::string& tag) {
+        appendStartTag(tag, "KEYBINDING", [&] { appendAttribute(tag, "NAME", key.name); });
+    };
+    if (!isSimple(key.value)) {
+        appendBinding(xml);
+        appendContent(xml, key.value);
+        return appendEndTag(xml, "KEYBINDING");
     }
-    const Element element(xml, "KEYVALUE", [&] {
-        appendAttribute(xml, "VALUETYPE", valueTypeOf(key.value.type));
-        appendAttribute(xml, "TYPE", xmlType(key.value.type));
+    const Tags& tags = tagsFrom(ofKeys, position, key, nullptr, [&](Tags& made) {
+        appendBinding(made.start);
+        appendStartTag(made.start, "KEYVALUE", [&] {
+            appendAttribute(made.start, "VALUETYPE", valueTypeOf(key.value.type));
+            appendAttribute(made.start, "TYPE", xmlType(key.value.type));
+        });
+        made.end = "</KEYVALUE></KEYBINDING>";
     });
-    appendEscaped(xml, charactersOf(value));
+    xml += tags.start;
+    appendContent(xml, key.value);
+    xml += tags.end;
 }
 
 void ObjectWriter::appendInstancePath(std::string& xml, const ObjectPath& path) const {

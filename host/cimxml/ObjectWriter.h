@@ -54,29 +54,37 @@ public:
 private:
     void appendNameSpacePath(std::string& xml, const ObjectPath& path) const;
     void appendLocalNameSpacePath(std::string& xml, const std::string& itsNameSpace) const;
-    void appendKey(std::string& xml, const NamedValue& key) const;
+    void appendProperty(std::string& xml, const NamedValue& property, const Property* declared,
+                        std::size_t position) const;
+    void appendKey(std::string& xml, const NamedValue& key, std::size_t position) const;
     void appendReference(std::string& xml, const ObjectPath& path) const;
-    const std::string& startTag(const NamedValue& property, const Property* declared, std::size_t position) const;
+    void appendContent(std::string& xml, const Value& value) const;
     void appendScalar(std::string& xml, const Scalar& scalar) const;
 
-    /** The start tag of a property, and what it depends on. */
-    struct StartTag {
+    /** The tags around the content of a property or a key, and what they depend on. */
+    struct Tags {
         std::string name{};
         CMPIType type = CMPI_null;
         bool isArray = false;
+        bool isNull = true;
         const Property* declared = nullptr;
-        std::string xml{};
+        std::string start{};
+        std::string end{};
     };
+
+    /** By position: the objects of a response usually have the same properties and keys in the same order. */
+    using TagsByPosition = std::vector<Tags>;
+
+    /** The tags that the last object had at this position if they are right for this one, or new ones. */
+    template <class Make>
+    static const Tags& tagsFrom(TagsByPosition& known, std::size_t position, const NamedValue& named,
+                                const Property* declared, Make make);
 
     std::string host;
     std::string nameSpace;
-
-    /** By position: the instances of a response usually have the same properties in the same order. */
-    mutable std::vector<StartTag> startTags{};
+    mutable TagsByPosition ofProperties{};
+    mutable TagsByPosition ofKeys{};
 };
-
-/** A value of a simple type as its characters, not escaped. */
-std::string charactersOf(const Scalar& scalar);
 
 /**
  * Checks that XML can represent all strings of a path, or of an instance with the wanted parts.

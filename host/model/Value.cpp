@@ -84,8 +84,4 @@ Value Value::nullStringObject() {
     return {CMPI_string, false, true, true};
 }
 
-ScalarRange Value::elements() const {
-    return isArray ? ScalarRange{items.data(), items.size()} : ScalarRange{&single, isNull ? 0U : 1U};
-}
-
 }  // namespace cimhost

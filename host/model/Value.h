@@ -72,7 +72,9 @@ struct Value {
     std::vector<Scalar> items{};   ///< the elements of an array; none when null
 
     /** The elements of an array, or the single value; none when null. */
-    ScalarRange elements() const;
+    ScalarRange elements() const {
+        return isArray ? ScalarRange{items.data(), items.size()} : ScalarRange{&single, isNull ? 0U : 1U};
+    }
 
     /** A single value of the scalar's own type. */
     static Value of(Scalar scalar);
