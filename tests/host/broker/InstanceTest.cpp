@@ -214,6 +214,16 @@ TEST_F(KnownClassTest, AKeyOfACloneIsWhereTheCloneSetsIt) {
     EXPECT_EQ(clone->ft->release(clone).rc, CMPI_RC_OK);
 }
 
+TEST_F(KnownClassTest, APropertySetAgainIsReplaced) {
+    CMPIInstance* instance = request.instance({{{}, "root/cimv2", "Known", {}}, {{"Other", cimhost::Value::of(1U)}}});
+    for (const CMPIUint32 value : {7U, 8U}) {
+        const CMPIValue number = uint32Value(value);
+        instance->ft->setProperty(instance, "OTHER", &number, CMPI_uint32);
+        EXPECT_THAT(names(instance), testing::ElementsAre("Other"));
+        EXPECT_EQ(instance->ft->getProperty(instance, "Other", nullptr).value.uint32, value);
+    }
+}
+
 TEST_F(KnownClassTest, ChecksNamesAndTypes) {
     CMPIInstance* instance = known();
     const CMPIValue number = uint32Value(7);
