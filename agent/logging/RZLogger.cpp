@@ -46,8 +46,11 @@ void writeIfAdmitted(const Record& record) noexcept {
     }
 }
 
-/** Whether a channel admits records of this level; true if that cannot be determined. */
-bool mayAdmit(const std::string& logger, int level) noexcept {
+/**
+ * Whether a channel admits records of this level; true if that cannot be determined. Not inline, so that the usual
+ * case, which does not come here, is cheap.
+ */
+[[gnu::noinline]] bool mayAdmit(const std::string& logger, int level) noexcept {
     const PreserveErrno preserveErrno;
     try {
         return level <= levelsOf(logger).highest();

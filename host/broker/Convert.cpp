@@ -16,7 +16,9 @@ struct PlainType {
     CMPIType type;
     Member CMPIValue::*member;
 
-    Scalar read(const CMPIValue& value) const { return Alternative{static_cast<Alternative>(value.*member)}; }
+    void read(const CMPIValue& value, Scalar& scalar) const {
+        scalar.emplace<Alternative>(static_cast<Alternative>(value.*member));
+    }
     void write(const Alternative& plain, CMPIValue& value) const { value.*member = static_cast<Member>(plain); }
     static bool holds(const Scalar& scalar) { return std::holds_alternative<Alternative>(scalar); }
     void writeFrom(const Scalar& scalar, CMPIValue& value) const { write(std::get<Alternative>(scalar), value); }
@@ -27,7 +29,7 @@ struct PlainType<Char16, CMPIChar16> {
     CMPIType type;
     CMPIChar16 CMPIValue::*member;
 
-    Scalar read(const CMPIValue& value) const { return Char16{value.*member}; }
+    void read(const CMPIValue& value, Scalar& scalar) const { scalar = Char16{value.*member}; }
     static bool holds(const Scalar& scalar) { return std::holds_alternative<Char16>(scalar); }
     void writeFrom(const Scalar& scalar, CMPIValue& value) const { value.*member = std::get<Char16>(scalar).code; }
 };
@@ -55,7 +57,7 @@ Scalar readPlain(const CMPIValue& value, CMPIType type) {
     Scalar scalar;
     const bool found = anyPlainType([&](const auto& each) {
         if (each.type == type) {
-            scalar = each.read(value);
+            each.read(value, scalar);
         }
         return each.type == type;
     });

@@ -30,6 +30,15 @@ ResultCursor cursorOf(Response results, ObjectForm form, InstanceParts parts = {
     return {std::move(results), form, std::move(parts)};
 }
 
+template <class Result>
+void moveAll(std::vector<Result>& source, std::vector<Result>& target) {
+    if (target.empty()) {
+        target.swap(source);
+    } else {
+        std::move(source.begin(), source.end(), std::back_inserter(target));
+    }
+}
+
 }  // namespace
 
 Response Operations::send(const Call& call, Request request) const {
@@ -70,8 +79,8 @@ Response Operations::enumerate(const Call& call, Request request) const {
         isServed = isServed || hasProvider;
         request.path.className = name;
         Response response = send(call, request);
-        std::move(response.instances.begin(), response.instances.end(), std::back_inserter(all.instances));
-        std::move(response.paths.begin(), response.paths.end(), std::back_inserter(all.paths));
+        moveAll(response.instances, all.instances);
+        moveAll(response.paths, all.paths);
     }
     if (!isServed) {
         throw CimError(CMPI_RC_ERR_INVALID_CLASS, "There is no class " + path.className + ".");

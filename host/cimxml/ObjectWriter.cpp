@@ -152,7 +152,7 @@ void requireRepresentable(const ObjectPath& path) {
 void requireRepresentable(const Instance& instance, const InstanceParts& parts) {
     requireRepresentable(instance.path);
     for (const NamedValue& property : instance.properties) {
-        if (isWanted(property.name, parts)) {
+        if (parts.haveAllProperties() || isWanted(property.name, parts)) {
             requireRepresentable(property.value, instance.path.className, property.name);
         }
     }
@@ -189,7 +189,7 @@ void ObjectWriter::appendInstance(std::string& xml, const Instance& instance, co
     const Class* known = parts.origins != nullptr ? parts.origins->findClass(instance.path.className) : nullptr;
     std::size_t position = 0;
     for (const NamedValue& property : instance.properties) {
-        if (isWanted(property.name, parts)) {
+        if (parts.haveAllProperties() || isWanted(property.name, parts)) {
             appendProperty(xml, property, known != nullptr ? known->findProperty(property.name) : nullptr, position++);
         }
     }

@@ -26,6 +26,8 @@ struct InstanceParts {
     PropertyList properties{};        ///< only these; none: all
     const Class* onlyOf = nullptr;    ///< only properties that this class has; null: all
     const Schema* origins = nullptr;  ///< writes the class origin of properties from this schema; null: none
+
+    bool haveAllProperties() const { return !properties && onlyOf == nullptr; }
 };
 
 /** Appends CIM objects as CIM-XML elements to a string. Not thread-safe. */
