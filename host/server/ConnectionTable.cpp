@@ -46,9 +46,10 @@ Connection::Phase Connection::phase() const {
     return current;
 }
 
-void Connection::endHandshake() {
+void Connection::endHandshake(gnutls_session_t itsSession) {
     enter(Phase::idle);
     const Guard lock(mutex);
+    session = itsSession;
     received -= std::min(received, bytesUnread(descriptor));  // the client may have sent its request already
 }
 
@@ -83,13 +84,23 @@ void Connection::end(Cause why) {
         return;
     }
     cause = why;
-    if (why == Cause::time && current == Phase::body && !tls) {
-        constexpr std::string_view timeout =
-            "HTTP/1.1 408 Request Timeout\r\nConnection: close\r\nContent-Length: 0\r\n\r\n";
-        static_cast<void>(::send(descriptor, timeout.data(), timeout.size(), MSG_NOSIGNAL | MSG_DONTWAIT) < 0);
+    if (why == Cause::time && current == Phase::body) {
+        sendTimeout();
     }
     ::shutdown(descriptor, SHUT_RDWR);
     ended.notify_all();
+}
+
+/** The thread of the connection only receives in this phase: a TLS session permits another thread to send. */
+void Connection::sendTimeout() const {
+    constexpr std::string_view timeout =
+        "HTTP/1.1 408 Request Timeout\r\nConnection: close\r\nContent-Length: 0\r\n\r\n";
+    if (session != nullptr) {
+        static_cast<void>(::gnutls_record_send(session, timeout.data(), timeout.size()) < 0);
+        static_cast<void>(::gnutls_bye(session, GNUTLS_SHUT_WR));
+    } else if (!tls) {
+        static_cast<void>(::send(descriptor, timeout.data(), timeout.size(), MSG_NOSIGNAL | MSG_DONTWAIT) < 0);
+    }
 }
 
 bool Connection::isOverdue(const Limits& limits, Clock::time_point now) {
@@ -211,11 +222,11 @@ bool ConnectionTable::endOne(const Filter& mayEnd) {
     return first != nullptr;
 }
 
-void ConnectionTable::endHandshake(int socket) {
+void ConnectionTable::endHandshake(int socket, gnutls_session_t session) {
     const Guard lock(mutex);
     for (Connection& each : connections) {
         if (each.socket() == socket && each.phase() == Connection::Phase::handshake) {
-            each.endHandshake();
+            each.endHandshake(session);
         }
     }
 }

@@ -111,7 +111,7 @@ struct HttpServer::Endpoint {
 
     static int noteHandshake(gnutls_session_t session, unsigned, unsigned, unsigned isIncoming, const gnutls_datum_t*) {
         if (isIncoming != 0) {
-            tlsServer.load()->table.endHandshake(gnutls_transport_get_int(session));
+            tlsServer.load()->table.endHandshake(gnutls_transport_get_int(session), session);
         }
         return 0;
     }
