@@ -63,10 +63,11 @@ public:
     int socket() const { return descriptor; }
     const ClientAddress& client() const { return origin; }
 
-    /** @name The last accepted credentials, for later requests of this connection. Used by its thread only. */
+    /** @name State for later requests of this connection. Used by its thread only. */
     ///@{
-    std::string authorization{};
+    std::string authorization{};  ///< the last accepted credentials
     Clock::time_point authorizedUntil{};
+    bool usesChunks = false;  ///< whether a response was sent in chunks
     ///@}
 
 private:
