@@ -14,8 +14,9 @@ namespace {
 /** A client that does not complete a body, or receives no byte of a response, for this time makes no progress. */
 constexpr std::chrono::seconds stalledTime{1};
 
-/** Bytes that a TLS client sends at most when it closes a connection. */
-constexpr std::uint64_t closureSize = 64;
+/** Bytes that are received at most when a client closes its connection: the system counts the end as one. */
+constexpr std::uint64_t closureSize = 1;
+constexpr std::uint64_t tlsClosureSize = 64;
 
 using Guard = std::lock_guard<std::mutex>;
 
@@ -70,7 +71,7 @@ bool Connection::hasTimedOut() const {
 
 bool Connection::hasPartOfHead() const {
     const Guard lock(mutex);
-    return current == Phase::idle && bytesReceived(descriptor) - received > (tls ? closureSize : 0);
+    return current == Phase::idle && bytesReceived(descriptor) - received > (tls ? tlsClosureSize : closureSize);
 }
 
 bool Connection::isEnding() const {

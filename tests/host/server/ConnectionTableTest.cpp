@@ -228,6 +228,19 @@ TEST_F(ConnectionTableTest, ARequestThatArrivesWithTheHandshakeIsPartOfAHead) {
     EXPECT_TRUE(client.connection->hasPartOfHead());
 }
 
+TEST_F(ConnectionTableTest, AClosedConnectionHasNoPartOfAHead) {
+    Added& closed = add();
+    closed.sockets.client.close();
+    pollfd ended{closed.sockets.server.get(), POLLIN, 0};
+    ASSERT_EQ(::poll(&ended, 1, 30'000), 1);
+    EXPECT_FALSE(closed.connection->hasPartOfHead());
+    Added& incomplete = add();
+    incomplete.sockets.client.send("POST");
+    pollfd arrived{incomplete.sockets.server.get(), POLLIN, 0};
+    ASSERT_EQ(::poll(&arrived, 1, 30'000), 1);
+    EXPECT_TRUE(incomplete.connection->hasPartOfHead());
+}
+
 TEST_F(ConnectionTableTest, BusyConnectionsAreThoseWithARequestThatIsNotRefused) {
     limits.connections = 10;
     limits.connectionsPerAddress = 10;
