@@ -16,10 +16,15 @@ constexpr unsigned notImplemented = 501;
     throw RequestRefused(badRequest, "request-not-loosely-valid", why);
 }
 
+/** The only child element of that name. */
 const XmlElement& childOf(const XmlElement& parent, std::string_view name) {
     const XmlElement* child = parent.child(name);
     if (child == nullptr) {
         notLooselyValid("Element " + parent.name + " has no " + std::string(name) + ".");
+    }
+    const auto isSame = [&](const XmlElement& each) { return each.name == name; };
+    if (std::count_if(parent.children.begin(), parent.children.end(), isSame) > 1) {
+        notLooselyValid("Element " + parent.name + " has more than one " + std::string(name) + ".");
     }
     return *child;
 }
@@ -60,8 +65,11 @@ void readParameters(Message& message, const XmlElement& call, std::string_view e
         if (each.name != elementName) {
             continue;
         }
-        message.parameters.emplace_back(attributeOf(each, "NAME"),
-                                        each.children.empty() ? XmlElement{} : each.children.front());
+        const std::string& name = attributeOf(each, "NAME");
+        if (each.children.size() > 1) {
+            notLooselyValid("Parameter " + name + " has more than one value.");
+        }
+        message.parameters.emplace_back(name, each.children.empty() ? XmlElement{} : each.children.front());
     }
 }
 
@@ -78,16 +86,18 @@ void readTarget(Message& message, const XmlElement& call) {
 }
 
 void readCall(Message& message, const XmlElement& request) {
-    if (const XmlElement* call = request.child("IMETHODCALL")) {
-        message.method = attributeOf(*call, "NAME");
-        message.nameSpace = nameSpaceOf(childOf(*call, "LOCALNAMESPACEPATH"));
+    message.isIntrinsic = request.child("IMETHODCALL") != nullptr;
+    if (message.isIntrinsic && request.child("METHODCALL") != nullptr) {
+        notLooselyValid("Element SIMPLEREQ has more than one operation.");
+    }
+    const XmlElement& call = childOf(request, message.isIntrinsic ? "IMETHODCALL" : "METHODCALL");
+    message.method = attributeOf(call, "NAME");
+    if (message.isIntrinsic) {
+        message.nameSpace = nameSpaceOf(childOf(call, "LOCALNAMESPACEPATH"));
         message.object = message.nameSpace;
-        readParameters(message, *call, "IPARAMVALUE");
+        readParameters(message, call, "IPARAMVALUE");
         return;
     }
-    const XmlElement& call = childOf(request, "METHODCALL");
-    message.isIntrinsic = false;
-    message.method = attributeOf(call, "NAME");
     readTarget(message, call);
     readParameters(message, call, "PARAMVALUE");
 }

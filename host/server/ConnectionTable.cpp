@@ -14,8 +14,9 @@ namespace {
 /** A client that does not complete a body, or receives no byte of a response, for this time makes no progress. */
 constexpr std::chrono::seconds stalledTime{1};
 
-/** Bytes that a TLS client sends at most when it closes a connection. */
-constexpr std::uint64_t closureSize = 64;
+/** Bytes that are received at most when a client closes its connection: the system counts the end as one. */
+constexpr std::uint64_t closureSize = 1;
+constexpr std::uint64_t tlsClosureSize = 64;
 
 using Guard = std::lock_guard<std::mutex>;
 
@@ -46,9 +47,10 @@ Connection::Phase Connection::phase() const {
     return current;
 }
 
-void Connection::endHandshake() {
+void Connection::endHandshake(gnutls_session_t itsSession) {
     enter(Phase::idle);
     const Guard lock(mutex);
+    session = itsSession;
     received -= std::min(received, bytesUnread(descriptor));  // the client may have sent its request already
 }
 
@@ -69,7 +71,7 @@ bool Connection::hasTimedOut() const {
 
 bool Connection::hasPartOfHead() const {
     const Guard lock(mutex);
-    return current == Phase::idle && bytesReceived(descriptor) - received > (tls ? closureSize : 0);
+    return current == Phase::idle && bytesReceived(descriptor) - received > (tls ? tlsClosureSize : closureSize);
 }
 
 bool Connection::isEnding() const {
@@ -83,13 +85,23 @@ void Connection::end(Cause why) {
         return;
     }
     cause = why;
-    if (why == Cause::time && current == Phase::body && !tls) {
-        constexpr std::string_view timeout =
-            "HTTP/1.1 408 Request Timeout\r\nConnection: close\r\nContent-Length: 0\r\n\r\n";
-        static_cast<void>(::send(descriptor, timeout.data(), timeout.size(), MSG_NOSIGNAL | MSG_DONTWAIT) < 0);
+    if (why == Cause::time && current == Phase::body) {
+        sendTimeout();
     }
     ::shutdown(descriptor, SHUT_RDWR);
     ended.notify_all();
+}
+
+/** The thread of the connection only receives in this phase: a TLS session permits another thread to send. */
+void Connection::sendTimeout() const {
+    constexpr std::string_view timeout =
+        "HTTP/1.1 408 Request Timeout\r\nConnection: close\r\nContent-Length: 0\r\n\r\n";
+    if (session != nullptr) {
+        static_cast<void>(::gnutls_record_send(session, timeout.data(), timeout.size()) < 0);
+        static_cast<void>(::gnutls_bye(session, GNUTLS_SHUT_WR));
+    } else if (!tls) {
+        static_cast<void>(::send(descriptor, timeout.data(), timeout.size(), MSG_NOSIGNAL | MSG_DONTWAIT) < 0);
+    }
 }
 
 bool Connection::isOverdue(const Limits& limits, Clock::time_point now) {
@@ -211,11 +223,11 @@ bool ConnectionTable::endOne(const Filter& mayEnd) {
     return first != nullptr;
 }
 
-void ConnectionTable::endHandshake(int socket) {
+void ConnectionTable::endHandshake(int socket, gnutls_session_t session) {
     const Guard lock(mutex);
     for (Connection& each : connections) {
         if (each.socket() == socket && each.phase() == Connection::Phase::handshake) {
-            each.endHandshake();
+            each.endHandshake(session);
         }
     }
 }

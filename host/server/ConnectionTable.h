@@ -1,5 +1,7 @@
 #pragma once
 
+#include <gnutls/gnutls.h>
+
 #include <chrono>
 #include <condition_variable>
 #include <cstdint>
@@ -41,7 +43,7 @@ public:
     Phase phase() const;
 
     /** Marks a TLS connection as ready for requests. To be called when the client's last message has been read. */
-    void endHandshake();
+    void endHandshake(gnutls_session_t itsSession);
 
     /** Notes that the client has sent a request that was accepted: its connection is ended for new ones later. */
     void trust();
@@ -61,10 +63,11 @@ public:
     int socket() const { return descriptor; }
     const ClientAddress& client() const { return origin; }
 
-    /** @name The last accepted credentials, for later requests of this connection. Used by its thread only. */
+    /** @name State for later requests of this connection. Used by its thread only. */
     ///@{
-    std::string authorization{};
+    std::string authorization{};  ///< the last accepted credentials
     Clock::time_point authorizedUntil{};
+    bool usesChunks = false;  ///< whether a response was sent in chunks
     ///@}
 
 private:
@@ -73,6 +76,7 @@ private:
 
     /** Shuts the connection down, so that its thread ends it. */
     void end(Cause why);
+    void sendTimeout() const;
     bool isOverdue(const Limits& limits, Clock::time_point now);
 
     /** Notes whether the client receives its response. */
@@ -83,6 +87,7 @@ private:
 
     const int descriptor;
     const bool tls;
+    gnutls_session_t session = nullptr;  ///< of a TLS connection after its handshake
     const ClientAddress origin;
     mutable std::mutex mutex;
     std::condition_variable ended;
@@ -97,10 +102,10 @@ private:
 };
 
 /**
- * All connections. Ends those that exceed a time limit; a client without TLS that sends its body too slowly receives
- * 408. If there are too many connections, of one network or altogether, each new one ends another: first those that
- * were refused, then those without an accepted password or request, then those whose body does not arrive, then idle
- * ones, then those that do not receive their response, at last those whose body arrives; of several the oldest.
+ * All connections. Ends those that exceed a time limit; a client that sends its body too slowly receives 408. If there
+ * are too many connections, of one network or altogether, each new one ends another: first those that were refused,
+ * then those without an accepted password or request, then those whose body does not arrive, then idle ones, then those
+ * that do not receive their response, at last those whose body arrives; of several the oldest.
  */
 class ConnectionTable {
 public:
@@ -117,8 +122,8 @@ public:
     /** Number of connections with a request that has not been refused. */
     std::size_t busy() const;
 
-    /** Marks the TLS connection of a socket as ready for requests. */
-    void endHandshake(int socket);
+    /** Marks the TLS connection of a session's socket as ready for requests. */
+    void endHandshake(int socket, gnutls_session_t session);
 
     /** Ends connections that have exceeded their time. To be called several times per second. */
     void endOverdue(Connection::Clock::time_point now);

@@ -51,12 +51,17 @@ Response bufferResponse(const std::string& body) {
             &MHD_destroy_response};
 }
 
-/** A short text as it is, with its length; a long one in chunks that are written when they are sent. */
-Response textResponse(std::shared_ptr<cimxml::ResponseText> text) {
+/**
+ * A short text as it is, with its length; a long one in chunks that are written when they are sent. After a response
+ * in chunks, all of the connection are: OpenPegasus' client library expects them.
+ */
+Response textResponse(std::shared_ptr<cimxml::ResponseText> text, Connection& connection) {
     auto stream = std::make_unique<Stream>(Stream{std::move(text), {}, 0});
-    if (!stream->source->append(stream->block, blockSize)) {
+    const bool isLong = stream->source->append(stream->block, blockSize);
+    if (!isLong && !connection.usesChunks) {
         return bufferResponse(stream->block);
     }
+    connection.usesChunks = true;
     return {MHD_create_response_from_callback(MHD_SIZE_UNKNOWN, blockSize, &readStream, stream.release(),
                                               [](void* context) { delete static_cast<Stream*>(context); }),
             &MHD_destroy_response};
@@ -111,7 +116,7 @@ struct HttpServer::Endpoint {
 
     static int noteHandshake(gnutls_session_t session, unsigned, unsigned, unsigned isIncoming, const gnutls_datum_t*) {
         if (isIncoming != 0) {
-            tlsServer.load()->table.endHandshake(gnutls_transport_get_int(session));
+            tlsServer.load()->table.endHandshake(gnutls_transport_get_int(session), session);
         }
         return 0;
     }
@@ -196,7 +201,8 @@ struct HttpServer::Endpoint {
         if (const auto* refused = std::get_if<HttpResponse>(&reply)) {
             return send(connection, exchange, *refused);
         }
-        const Response response = textResponse(std::get<std::shared_ptr<cimxml::ResponseText>>(reply));
+        const Response response =
+            textResponse(std::get<std::shared_ptr<cimxml::ResponseText>>(reply), *exchange.connection);
         addCimHeaders(response.get(), exchange.extensionPrefix);
         return queue(connection, exchange, response, MHD_HTTP_OK);
     }

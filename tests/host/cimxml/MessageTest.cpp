@@ -55,6 +55,26 @@ TEST_F(MessageTest, RefusesWhatIsNotARequest) {
               "400 request-not-loosely-valid");
 }
 
+TEST_F(MessageTest, RefusesElementsThatAreThereTwice) {
+    const std::string nameSpace = "<LOCALNAMESPACEPATH><NAMESPACE NAME=\"root\"/></LOCALNAMESPACEPATH>";
+    const std::string call = "<IMETHODCALL NAME=\"GetClass\">" + nameSpace + "</IMETHODCALL>";
+    for (const std::string& second : {call, "<METHODCALL NAME=\"x\"><LOCALCLASSPATH>" + nameSpace +
+                                                "<CLASSNAME NAME=\"x\"/></LOCALCLASSPATH></METHODCALL>"}) {
+        EXPECT_EQ(refusalOf(replaced(valid, "</SIMPLEREQ>", second + "</SIMPLEREQ>")), "400 request-not-loosely-valid");
+    }
+    EXPECT_EQ(refusalOf(replaced(valid, "</IMETHODCALL>", nameSpace + "</IMETHODCALL>")),
+              "400 request-not-loosely-valid");
+    EXPECT_EQ(
+        refusalOf(replaced(valid, "<CLASSNAME NAME=\"Base\"/>", "<CLASSNAME NAME=\"Base\"/><CLASSNAME NAME=\"x\"/>")),
+        "400 request-not-loosely-valid");
+    EXPECT_EQ(refusalOf(replaced(valid, "</MESSAGE>", "<SIMPLEREQ>" + call + "</SIMPLEREQ></MESSAGE>")),
+              "400 request-not-loosely-valid");
+}
+
+TEST_F(MessageTest, IgnoresUnknownElementsAndAttributes) {
+    EXPECT_EQ(refusalOf(replaced(valid, "<SIMPLEREQ>", "<SIMPLEREQ EXTRA=\"1\"><EXTRA/>")), "accepted");
+}
+
 TEST_F(MessageTest, RefusesSeveralOperationsAndExports) {
     EXPECT_EQ(refusalOf(replaced(replaced(valid, "<SIMPLEREQ>", "<MULTIREQ>"), "</SIMPLEREQ>", "</MULTIREQ>")),
               "501 multiple-requests-unsupported");

@@ -210,7 +210,7 @@ TEST_F(ConnectionTableTest, AHandshakeIsLimitedLikeAHeadAndIsNotPartOfOne) {
     }
     std::array<char, 5> read{};
     ASSERT_EQ(::recv(ready.sockets.server.get(), read.data(), read.size(), 0), 5);
-    table.endHandshake(ready.sockets.server.get());
+    table.endHandshake(ready.sockets.server.get(), nullptr);
     endOverdueAfter(0s);
     endOverdueAfter(11s);
     EXPECT_FALSE(slow.isOpen());
@@ -224,8 +224,21 @@ TEST_F(ConnectionTableTest, ARequestThatArrivesWithTheHandshakeIsPartOfAHead) {
     std::array<char, 105> awaited{};
     ASSERT_EQ(::recv(client.sockets.server.get(), awaited.data(), awaited.size(), MSG_PEEK | MSG_WAITALL), 105);
     ASSERT_EQ(::recv(client.sockets.server.get(), read.data(), read.size(), 0), 5);
-    table.endHandshake(client.sockets.server.get());
+    table.endHandshake(client.sockets.server.get(), nullptr);
     EXPECT_TRUE(client.connection->hasPartOfHead());
+}
+
+TEST_F(ConnectionTableTest, AClosedConnectionHasNoPartOfAHead) {
+    Added& closed = add();
+    closed.sockets.client.close();
+    pollfd ended{closed.sockets.server.get(), POLLIN, 0};
+    ASSERT_EQ(::poll(&ended, 1, 30'000), 1);
+    EXPECT_FALSE(closed.connection->hasPartOfHead());
+    Added& incomplete = add();
+    incomplete.sockets.client.send("POST");
+    pollfd arrived{incomplete.sockets.server.get(), POLLIN, 0};
+    ASSERT_EQ(::poll(&arrived, 1, 30'000), 1);
+    EXPECT_TRUE(incomplete.connection->hasPartOfHead());
 }
 
 TEST_F(ConnectionTableTest, BusyConnectionsAreThoseWithARequestThatIsNotRefused) {

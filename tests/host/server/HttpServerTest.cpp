@@ -37,10 +37,11 @@ protected:
     Socket connect() { return connectTo(server().listeners().front().port); }
 
     /** A request with a header Content-Length, and the complete body or none. */
-    std::string requestOf(const std::string& credentials, bool hasBody = true) const {
-        const std::string content = body("EnumerateInstances", "ClassName", "<CLASSNAME NAME=\"Thing\"/>");
+    static std::string requestOf(const std::string& credentials, bool hasBody = true,
+                                 const std::string& operation = "EnumerateInstances") {
+        const std::string content = body(operation, "ClassName", "<CLASSNAME NAME=\"Thing\"/>");
         std::string text = "POST /cimom HTTP/1.1\r\n";
-        for (const auto& [name, value] : head("EnumerateInstances", credentials).headers) {
+        for (const auto& [name, value] : head(operation, credentials).headers) {
             text += name + ": " + value + "\r\n";
         }
         return text + "Content-Length: " + std::to_string(content.size()) + "\r\n\r\n" + (hasBody ? content : "");
@@ -65,6 +66,32 @@ protected:
         EXPECT_THAT(client.receiveUntil("\r\n\r\n"), StartsWith("HTTP/1.1 200 "));
         return client;
     }
+
+    /** Whether an operation of another client is in progress while the test has this object. */
+    class OtherOperation {
+    public:
+        explicit OtherOperation(HttpServerTest& test) : client(test.connect()) {
+            test.manager.answerWith([this, isFinished = finished.get_future().share()](const Request&) {
+                begun.set_value();
+                isFinished.wait();
+                return Response{};
+            });
+            client.send(requestOf(test.reader));
+            begun.get_future().wait();
+            test.manager.answerWith([](const Request&) { return Response{}; });
+        }
+
+        /** Its response. */
+        std::string finish() {
+            finished.set_value();
+            return client.receiveUntil("</CIM>\n");
+        }
+
+    private:
+        std::promise<void> begun;
+        std::promise<void> finished;
+        Socket client;
+    };
 
     std::string log() const { return testsupport::readFile(directory.path() / "log"); }
 
@@ -154,6 +181,44 @@ TEST_F(HttpServerTest, IdleConnectionsEnd) {
     const Socket client = connect();
     EXPECT_THAT(served(client), StartsWith("HTTP/1.1 200 "));
     EXPECT_EQ(client.receive(), "");
+}
+
+TEST_F(HttpServerTest, ARequestThatWaitsTooLongForOthersIsRefused) {
+    settings.limits.requestsAtWork = 1;
+    settings.limits.queueTime = 0s;
+    OtherOperation other(*this);
+    const Socket client = connect();
+    client.send(requestOf(reader));
+    EXPECT_THAT(client.receiveUntil("too many requests"),
+                testing::AllOf(StartsWith("HTTP/1.1 503 "), HasSubstr("Retry-After: 5\r\n")));
+    EXPECT_THAT(other.finish(), StartsWith("HTTP/1.1 200 "));
+    EXPECT_THAT(served(connect()), StartsWith("HTTP/1.1 200 "));
+}
+
+TEST_F(HttpServerTest, ARequestWaitsForOthersAtWork) {
+    settings.limits.requestsAtWork = 1;
+    settings.limits.queueTime = 1h;
+    OtherOperation other(*this);
+    const Socket client = connect();
+    client.send(requestOf(reader));
+    EXPECT_TRUE(client.isSilent());
+    EXPECT_THAT(other.finish(), StartsWith("HTTP/1.1 200 "));
+    EXPECT_THAT(client.receiveUntil("</CIM>\n"), StartsWith("HTTP/1.1 200 "));
+}
+
+TEST_F(HttpServerTest, EnumerationsThatAreOpenAreLimited) {
+    settings.limits.enumerations.open = 2;
+    manager.answerWith([](const Request&) {
+        return Response::ofInstances({{{"", "root/test", "Thing", {{"Name", Value::of(std::string("a"))}}}, {}}});
+    });
+    const Socket client = connect();
+    const auto open = [&](const std::string& credentials) {
+        client.send(requestOf(credentials, true, "OpenEnumerateInstances"));
+        return client.receiveUntil("</CIM>\n");
+    };
+    EXPECT_THAT(open(reader), HasSubstr("EnumerationContext"));
+    EXPECT_THAT(open(writer), HasSubstr("EnumerationContext"));
+    EXPECT_THAT(open(reader), testing::AllOf(StartsWith("HTTP/1.1 200 "), HasSubstr("<ERROR CODE=\"27\" ")));
 }
 
 TEST_F(HttpServerTest, IncompleteRequestsAreLogged) {

@@ -65,8 +65,8 @@ protected:
 
     RequestHandler& handler() {
         if (!started) {
-            operations = std::make_unique<cimxml::Operations>(schema, registry, manager,
-                                                              cimxml::OperationsOptions{"host", "1", {}});
+            operations = std::make_unique<cimxml::Operations>(
+                schema, registry, manager, cimxml::OperationsOptions{"host", "1", settings.limits.enumerations});
             started = std::make_unique<RequestHandler>(settings, *operations, authenticator, log);
         }
         return *started;
