@@ -27,6 +27,7 @@ PLOTTED = [*((operation, "VELKO_Lease") for operation in ("Load", "EnumInstances
            *(case for what, case in SEARCHES)]
 HEAD = "<!-- Written by script/benchmark. -->\n\n# Performance figures\n\n"
 SIDES = ("provider", "baseline")
+NOT_SHOWN = {100, 100000}  # numbers of records that only the picture shows
 # Loading is timed separately, other requests alternately with the baseline. Searches are also timed separately, because
 # the baseline walks over the table, which then fills the processor's caches.
 TIMED = "^Load/|/both/|/gate/|^(GetInstance|AssociatorNames.fromComputer).*/provider/"
@@ -81,6 +82,11 @@ def ratio_text(times):
     return f"{ratio:.1f}" if ratio < 99.95 else f"{ratio:,.0f}"
 
 
+def is_end(case):
+    """Returns whether a case gets the first or last record, which takes the time of the middle one."""
+    return case[0].endswith((".first", ".last"))
+
+
 def table(head, rows):
     lines = ["| " + " | ".join(head) + " |", "|---|---|" + "---:|" * (len(head) - 2)]
     lines += ["| " + " | ".join(row) + " |" for row in rows]
@@ -89,7 +95,7 @@ def table(head, rows):
 
 def table_by_size(cases, cell, head):
     """Returns a table with a row per request and class and a column per number of records. `cell` formats the times."""
-    sizes = sorted({size for by_size in cases.values() for size in by_size})
+    sizes = sorted({size for by_size in cases.values() for size in by_size} - NOT_SHOWN)
     rows = [[operation, class_name, *(cell(by_size[size]) if size in by_size else "" for size in sizes)]
             for (operation, class_name), by_size in cases.items()]
     return table([*head, *(f"{size:,}" for size in sizes)], rows)
@@ -99,7 +105,7 @@ def requests_tables(cases):
     """Returns two tables of the provider's times and their ratio to the baseline's: for several sizes and for one."""
     def cell(times):
         return f"{time_text(times['provider'])} ({ratio_text(times)})"
-    several = {case: by_size for case, by_size in cases.items() if len(by_size) > 1}
+    several = {case: by_size for case, by_size in cases.items() if len(by_size) > 1 and not is_end(case)}
     rows = [[operation, class_name, f"{size:,}", cell(times)] for (operation, class_name), by_size in cases.items()
             if len(by_size) == 1 for size, times in by_size.items()]
     return (table_by_size(several, cell, ["Request", "Class"]) + "\n" +
@@ -109,13 +115,12 @@ def requests_tables(cases):
 def gate_table(cases):
     """Returns the time that the gate adds, and its share of the request's time without the gate.
 
-    Leaves out the first and last record: the position does not change what the gate adds.
     """
     def cell(times):
         added = times["gated"] - times["alone"]
         return f"{added / 1e3:+.1f} µs ({added / times['alone']:+.1%})"
     gated = {case: {size: times for size, times in by_size.items() if "gated" in times}
-             for case, by_size in cases.items() if not case[0].endswith((".first", ".last"))}
+             for case, by_size in cases.items() if not is_end(case)}
     return table_by_size({case: by_size for case, by_size in gated.items() if by_size}, cell, ["Request", "Class"])
 
 

@@ -17,9 +17,9 @@ namespace KO::LeaseWarrantyProvider {
 
 // This program does not trace.
 template <>
-RecordTrace<LeaseStoreTraits>::RecordTrace() {}
+RecordTrace<LeaseStoreTraits>::RecordTrace() = default;
 template <>
-RecordTrace<WarrantyStoreTraits>::RecordTrace() {}
+RecordTrace<WarrantyStoreTraits>::RecordTrace() = default;
 
 }  // namespace KO::LeaseWarrantyProvider
 

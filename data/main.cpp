@@ -172,6 +172,7 @@ int run(Command command) {
 CLI::App* addClassCommand(CLI::App& app, const char* name, const char* description, std::string& className) {
     CLI::App* command = app.add_subcommand(name, description);
     std::vector<std::string> names;
+    names.reserve(recordClasses.size());
     for (const RecordClass& each : recordClasses) {
         names.emplace_back(each.name);
     }

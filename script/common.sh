@@ -66,12 +66,14 @@ install_packages() {
     as_root env DEBIAN_FRONTEND=noninteractive apt-get install -y -qq --no-install-recommends "${packages[@]}"
 }
 
-# build PRESET [TARGET...]: configures a preset and builds it, or only some of its targets.
+# build PRESET [TARGET...]: configures a preset, with the options in `configuration`, and builds it, or only some of its
+# targets.
+configuration=()
 build() {
     local preset=$1
     shift
     heading "Building preset $preset"
-    cmake --preset "$preset"
+    cmake --preset "$preset" "${configuration[@]}"
     cmake --build --preset "$preset" --parallel "$(nproc)" ${1:+--target "$@"}
 }
 

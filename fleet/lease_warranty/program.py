@@ -1,4 +1,4 @@
-"""How each tool ends: 0 for success, 1 with the reason if it failed, 2 for wrong usage."""
+"""Exit status of the tools: 0 for success, 1 with the reason if the tool failed, 2 for wrong usage."""
 
 import argparse
 import sys

@@ -5,7 +5,7 @@
 #include <string>
 #include <utility>
 
-// How requests fail, and the messages for that.
+// Failures of requests, and their messages.
 
 namespace gate {
 

@@ -101,7 +101,7 @@ CMPIValue reference(const CMPIObjectPath* target) {
     return value;
 }
 
-/** Converts what a getter returned for a property, or fails. None if the value is absent or null. */
+/** Converts the result of a getter for a property; none if the value is absent or null. Fails if the getter failed. */
 std::optional<std::string> convert(const CMPIData& data, const CMPIStatus& status, const Property& property) {
     if (isAbsent(status)) {
         return std::nullopt;

@@ -25,7 +25,7 @@ std::string toString(const CMPIString* string);
 /** Whether a status says that a key or property does not exist. */
 bool isAbsent(const CMPIStatus& status);
 
-/** Says what the object manager could not do, with its status and its reason if it returned one. */
+/** The message that the object manager could not do a task, with its status and its reason if it returned one. */
 std::string managerFailure(const char* task, const CMPIStatus& status);
 
 /** Fails with managerFailure() if the object manager could not do its task. */

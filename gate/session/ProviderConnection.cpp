@@ -15,12 +15,12 @@ namespace gate {
 namespace {
 
 /**
- * How long a shutdown waits for requests that wait for other programs, such as slow clients. They may wait for the
+ * The time that a shutdown waits for requests that wait for other programs, such as slow clients. They may wait for the
  * thread that ends the object manager or the process.
  */
 constexpr std::chrono::seconds drainTimeout{5};
 
-/** How long a request waits for another process that uses the data directory, and for up-calls of the provider. */
+/** The time that a request waits for another process that uses the data directory, and for up-calls of the provider. */
 constexpr std::chrono::seconds waitTimeout{5};
 constexpr std::chrono::milliseconds pollInterval{10};
 
@@ -135,7 +135,7 @@ void ProviderConnection::requireCurrent(LockGuard& guard, bool mayBeOlder) {
 
 /**
  * Loads the provider, which reads its files. Unloads it first if it is loaded and the files are complete. Returns
- * whether they are, and did not change meanwhile.
+ * whether the files are complete and did not change during the call.
  */
 bool ProviderConnection::load() {
     if (theDirectory.hasLostFiles()) {

@@ -89,7 +89,7 @@ ProviderAnswer ProviderSession::call(Interface* interface, const LocalObject& pa
     return std::move(result.answer);
 }
 
-/** The same for a function that ends its answer, and that omits the objects that it cannot create. */
+/** The same for a function of the provider that ends its answer and omits objects that it cannot create. */
 template <auto function, class Interface, class... Arguments>
 ProviderAnswer ProviderSession::read(Interface* interface, const LocalObject& path, Arguments... arguments) const {
     ProviderAnswer answer = call<function>(interface, path, arguments...);

@@ -44,10 +44,10 @@ public:
     void release() noexcept;
     /** Acquires the lock after an intermediate release(). If the lock is closed, waits until it is opened. */
     void reacquire() noexcept;
-    /** The same, but false, without the lock, if it has been closed since that generation. */
+    /** The same, but returns false without the lock if it has been closed since that generation. */
     bool reacquire(std::size_t itsGeneration) noexcept;
 
-    /** How often the lock has been closed. A request of an earlier generation has lost its object manager. */
+    /** Number of shutdowns. A request of an earlier generation has lost its object manager. */
     std::size_t generation() const noexcept { return timesClosed; }
 
     /**
@@ -63,7 +63,7 @@ public:
     /** Opens a closed lock. @return whether it is open now: it is not while closing, or if closed permanently */
     bool open() noexcept;
 
-    /** Whether requests of other threads have not ended. */
+    /** Whether requests of other threads are running. */
     bool hasOtherRequests() const noexcept;
 
     /** The number of threads that wait for the lock. */

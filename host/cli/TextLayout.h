@@ -23,7 +23,7 @@ inline std::string joined(const std::vector<std::string>& words, std::string_vie
 
 namespace cimhost::text {
 
-/** When to use colours. */
+/** The values of --color. */
 enum class Colours { automatic, always, never };
 
 /** Style of output for people. */
@@ -34,7 +34,7 @@ struct Style {
 
 /**
  * The style for a file descriptor. With Colours::automatic, a terminal has colours unless NO_COLOR is set or TERM is
- * "dumb". The width of a terminal is COLUMNS, or else what it reports.
+ * "dumb". The width of a terminal is COLUMNS if that is set, otherwise the reported width.
  */
 Style styleFor(int descriptor, Colours mode);
 

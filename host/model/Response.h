@@ -18,7 +18,7 @@ struct ProviderResponse {
     bool threw = false;         ///< whether the provider threw an exception
     bool releasedPath = false;  ///< whether the provider released a path that the result keeps
     ResultEvents events{};      ///< the results, in order, also those before a failure
-    std::string crashReason{};  ///< why the provider's process would have crashed, as a sentence; empty: it would not
+    std::string crashReason{};  ///< a sentence if the provider's process would have crashed, otherwise empty
 
     int doneCount() const { return cimhost::doneCount(events); }
 };

@@ -19,7 +19,7 @@ enum class FactoryChoice {
     neither  ///< the library is rejected
 };
 
-/** How an object manager loads libraries and calls factories and cleanup. */
+/** Options for loading libraries and for the calls of factories and cleanup. */
 struct ProviderPolicy {
     FactoryChoice factory = FactoryChoice::named;
     bool bindsLazily = false;             ///< functions of a library are resolved at their first call
@@ -80,7 +80,7 @@ public:
 
     /** @name Responses */
     ///@{
-    /** Why the response would have crashed the provider's process, as a sentence; empty: it would not. */
+    /** A sentence on the cause if the response would have crashed the provider's process, otherwise empty. */
     virtual std::string crashReason(const ProviderResponse& /*response*/, Operation /*operation*/) const { return {}; }
 
     /** The status that the client receives for a provider's response: OK, or a code with a message. */

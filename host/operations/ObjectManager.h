@@ -31,8 +31,8 @@ struct ObjectManagerOptions {
  * without cleanup as soon as no request is running. The provider then loses its state in memory.
  *
  * A provider receives the context entries of the request, those of the options, and CMPIInvocationFlags (0),
- * CMPIInitNameSpace (the request's namespace) and CMPIPrincipal (ManagerBehaviour::principal). Of entries with the same
- * name, the first of these applies.
+ * CMPIInitNameSpace (the request's namespace) and CMPIPrincipal (ManagerBehaviour::principal). If several of these have
+ * the same name, the first applies.
  */
 class ObjectManager : public UpCalls {
 public:

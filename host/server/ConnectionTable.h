@@ -96,7 +96,7 @@ private:
     bool isTrusted = false;
     Clock::time_point since;         ///< when the phase began
     std::uint64_t received = 0;      ///< bytes received when it began
-    Clock::time_point headSince{};   ///< when the head was seen to have begun; none: it has not
+    Clock::time_point headSince{};   ///< when the first byte of the head was seen; none before that
     std::uint64_t acknowledged = 0;  ///< bytes that the client had acknowledged at `progress`
     Clock::time_point progress;      ///< when the phase began, or bytes of the response were last acknowledged
 };

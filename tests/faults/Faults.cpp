@@ -19,7 +19,7 @@ namespace faults {
 
 namespace {
 
-constexpr std::array<const char*, operationKinds + 1> names{
+constexpr std::array<const char*, operationKinds + 1> operationNames{
     "allocation", "taking of memory", "opening",        "reading",  "writing",
     "seeking",    "syncing",          "renaming",       "removing", "closing",
     "asking",     "owning",           "path resolving", "locking",  "operation on files",
@@ -107,7 +107,7 @@ void printError(std::ostream& stream, int error) {
 }  // namespace
 
 const char* nameOf(OperationKind kind) {
-    return names.at(kind);
+    return operationNames.at(kind);
 }
 
 bool isOnFiles(OperationKind kind) {

@@ -107,7 +107,7 @@ TEST_F(GateLoadFaultTest, NoRecordIsLostWhateverFailsWhileItBecomesTheOwner) {
     const Lines complete = leases();
     EXPECT_NE(changed, complete);
     const auto failOne = [&](const Fault& fault) { expectStored(changeAfterOtherOwner(&fault), changed, complete); };
-    eachFault(counts, fileFailures(), failOne, FaultSelection{false});  // waits for a lasting one to end
+    eachFault(counts, fileFailures(), failOne, FaultSelection{false});  // the gate waits until lasting failures end
     eachFault(counts, allocationFailures, failOne, someOnce);
 }
 

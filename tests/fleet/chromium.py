@@ -16,14 +16,14 @@ OPTIONS = ["--headless=new", "--remote-debugging-pipe", "--no-first-run", "--dis
 
 
 class Chromium:
-    """One page. Remembers what it requests and what it reports as errors."""
+    """One page. Records its requests and the errors that it reports."""
 
     def __init__(self):
         self.profile = tempfile.TemporaryDirectory(ignore_cleanup_errors=True)
         to_browser, self.output = os.pipe()
         self.input, from_browser = os.pipe()
         sandbox = ["--no-sandbox"] if os.geteuid() == 0 else []
-        # The browser expects its pipe at 3 and 4.
+        # The browser reads from file descriptor 3 and writes to 4.
         command = ["sh", "-c", f'exec "$@" 3<&{to_browser} 4>&{from_browser}', "sh", PROGRAM, *OPTIONS, *sandbox,
                    f"--user-data-dir={self.profile.name}", "about:blank"]
         self.process = subprocess.Popen(command, pass_fds=(to_browser, from_browser), stdin=subprocess.DEVNULL,

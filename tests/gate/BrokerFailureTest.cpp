@@ -188,7 +188,7 @@ TEST_F(BrokerFailureTest, ReturnsAFixedMessageIfTheBrokerCannotCreateStrings) {
     EXPECT_THAT(gate().execQuery(classPath(lease), "WQL", "select"), isRefused(CMPI_RC_ERR_NOT_SUPPORTED, "Enumerate"));
 }
 
-/** A broker one of whose functions throws in one of the next calls. */
+/** A broker with a function that throws in one of the next calls. */
 struct ThrowingBroker {
     static inline int callsUntilThrow = 0;
     static inline bool throwsStandard = false;

@@ -56,7 +56,7 @@ public:
         changed.wait(lock, [&] { return inside > 0; });
     }
 
-    /** Returns whether a request is in the provider, or none ever was. */
+    /** Returns whether a request is in the provider, or no request has been. */
     bool isBusy() {
         const std::lock_guard<std::mutex> lock(mutex);
         return inside > 0 || most == 0;

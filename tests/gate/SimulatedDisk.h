@@ -11,8 +11,8 @@
 #include "support/AgentEnvironment.h"
 #include "support/Files.h"
 
-// The states that a file system may have after a power failure. Of the names that were not synced, any subset may have
-// changed. Of the writes that were not synced, any first part may be there, or all with one of them as zeros.
+// The states that a file system may have after a power failure: any subset of the changes of names that were not
+// synced, and the first part of the writes that were not synced, or all of them with one write as zeros.
 
 namespace gatetest {
 

@@ -9,7 +9,6 @@
 #include "support/Recording.h"
 
 namespace testsupport {
-namespace {
 
 /** The responses to enumerations. */
 class ServedInstances : public cimhost::UpCalls {
@@ -40,8 +39,6 @@ public:
 private:
     std::map<std::string, cimhost::Response> served;
 };
-
-}  // namespace
 
 /** The members of a RecordingBroker. */
 struct RecordingBroker::State {

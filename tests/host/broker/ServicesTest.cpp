@@ -126,7 +126,7 @@ TEST_F(ServicesTest, AThreadCanExit) {
     EXPECT_EQ(answer, &threads);
 }
 
-/** Shared by two threads. */
+/** A mutex and a condition that two threads use. */
 struct Meeting {
     const CMPIBrokerExtFT* threads;
     void* mutex;

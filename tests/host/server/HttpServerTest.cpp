@@ -245,7 +245,7 @@ TEST_F(HttpServerTest, StopEndsSlowReadersAfterTheTime) {
     manager.answerWith([](const Request&) { return largeResponse(); });
     const Socket reading = slowReader();
     EXPECT_TRUE(server().drain(0s));
-    reading.receive();  // what the server has sent before it ended the connection
+    reading.receive();  // the bytes that the server sent before it ended the connection
 }
 
 TEST_F(HttpServerTest, StopWaitsForOperationsAndReportsThoseThatStillRun) {

@@ -8,12 +8,12 @@
 namespace cimhost::lab {
 namespace {
 
-constexpr const char* names[] = {"standard", "sfcb", "pegasus", "pegasus-empty-key"};
+constexpr const char* managerNames[] = {"standard", "sfcb", "pegasus", "pegasus-empty-key"};
 
 }  // namespace
 
 const char* nameOf(Manager manager) {
-    return names[static_cast<std::size_t>(manager)];
+    return managerNames[static_cast<std::size_t>(manager)];
 }
 
 std::optional<Manager> managerNamed(std::string_view name) {

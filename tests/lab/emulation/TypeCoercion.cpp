@@ -64,7 +64,7 @@ Status refused(const std::string& name, const char* why) {
     return {CMPI_RC_ERR_TYPE_MISMATCH, "The property " + name + " " + why};
 }
 
-/** Makes the value one of the property's type. */
+/** Converts the value to the property's type. */
 Status convert(NamedValue& sent, const PropertyInfo& property) {
     const IntegerType* target = integerType(property.type);
     const bool isConvertible = target != nullptr && !sent.value.isArray && !property.isArray;

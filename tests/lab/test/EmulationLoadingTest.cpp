@@ -6,7 +6,7 @@
 #include "host/operations/OperationsFixture.h"
 #include "lab/emulation/ManagerEmulation.h"
 
-// How object managers load libraries and start providers, where they differ.
+// Differences in how object managers load libraries and start providers.
 
 namespace {
 
