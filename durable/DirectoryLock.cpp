@@ -43,12 +43,12 @@ DirectoryLock::State stateAfter(int error) {
 }
 
 /**
- * Whether the file may be written. A user of the directory could otherwise let a process of root change a file
+ * Whether the file must not be written. A user of the directory could otherwise let a process of root change a file
  * elsewhere, to which that user has added the name "owner".
  */
-bool isOnlyOwnerFile(int descriptor) {
+bool isForeign(int descriptor) {
     struct stat file {};
-    return fstat(descriptor, &file) == 0 && S_ISREG(file.st_mode) && file.st_nlink <= 1;
+    return fstat(descriptor, &file) == 0 && (!S_ISREG(file.st_mode) || file.st_nlink > 1);
 }
 
 /**
@@ -72,7 +72,7 @@ DirectoryLock::Result DirectoryLock::acquire(const std::string& directory) {
     release();  // inherited from the parent process, or removed from the directory
     descriptor = open(path.c_str(), O_RDWR | O_CREAT | O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK, 0644);
     const bool isOpen = descriptor >= 0;
-    if (isOpen && !isOnlyOwnerFile(descriptor)) {
+    if (isOpen && isForeign(descriptor)) {
         release();
         return {State::denied, path + ": It is not a regular file, or has another name too. Remove it"};
     }
