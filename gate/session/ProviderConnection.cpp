@@ -178,7 +178,11 @@ bool ProviderConnection::hasRead(const Class& owner, std::optional<std::size_t> 
     if (!count) {
         return false;
     }
-    if (count != counts[static_cast<std::size_t>(found - recordClasses.begin())]) {
+    const auto index = static_cast<std::size_t>(found - recordClasses.begin());
+    if (!counts[index]) {  // the gate could not read the file, but the provider may have
+        counts[index] = theDirectory.recordCounts()[index];
+    }
+    if (count != counts[index]) {
         setOutdated();
         fail(CMPI_RC_ERR_FAILED, std::string("The provider could not read the records of ") + owner.name +
                                      "; see the agent's log at level 3000. It reads them again; repeat the request.");
