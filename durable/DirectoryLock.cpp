@@ -74,7 +74,7 @@ DirectoryLock::Result DirectoryLock::acquire(const std::string& directory) {
     const bool isOpen = descriptor >= 0;
     if (isOpen && isForeign(descriptor)) {
         release();
-        return {State::denied, path + ": It is not a regular file, or has another name too. Remove it"};
+        return {State::denied, path + ": " + "It is not a regular file, or has another name too. Remove it"};
     }
     const int error = isOpen ? tryLock(descriptor) : errno;
     if (error == 0) {
