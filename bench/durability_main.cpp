@@ -1,9 +1,10 @@
-// Measures the cost of durable storage for a modification of one of 100 leases.
+// Measures the cost of durable storage: modifications, creations with values and reads of one among 100 leases.
 //
-// Usage: durability_benchmark [CHANGES]
+// Usage: durability_benchmark [REQUESTS]
 //
-// Prints microseconds per modification, as medians of one run: by the provider alone, through the gate without syncs,
-// through the gate, and through the gate on a disk on which each sync takes a millisecond.
+// Prints microseconds and syncs per request, as medians and means of one run: by the provider alone, through the gate
+// without syncs, through the gate, and through the gate on a disk on which each sync takes a millisecond. The provider
+// ignores the values of a creation, so without the gate a creation with values is a creation and a modification.
 
 #include <dlfcn.h>
 #include <fcntl.h>
@@ -65,42 +66,97 @@ struct Case {
 
 constexpr std::size_t leases = 100;
 
-bench::ExpectedRequest modification(int number) {
-    return {bench::modification(bench::recordPath("VELKO_Lease", bench::instanceIdOf(7, leases)),
-                                bench::namedString("Lessor", "Lessor " + std::to_string(1000 + number)))};
+using Requests = std::vector<bench::ExpectedRequest>;
+
+/** A kind of requests, each with another number. */
+struct Operation {
+    const char* name;
+    Requests (*timed)(int number, bool isGated);
+    Requests (*after)();  ///< restores the number of leases
+};
+
+cimhost::ObjectPath pathOf(std::size_t number) {
+    return bench::recordPath("VELKO_Lease", bench::instanceIdOf(number, leases));
 }
 
-void measure(bench::Environment& environment, const Case& tested, int changes) {
+const cimhost::ObjectPath& newPath() {
+    static const cimhost::ObjectPath path = bench::recordPath("VELKO_Lease", "new lease");
+    return path;
+}
+
+cimhost::NamedValue lessor(int number) {
+    return bench::namedString("Lessor", "Lessor " + std::to_string(1000 + number));
+}
+
+Requests noRequests() {
+    return {};
+}
+
+Requests read(int, bool) {
+    return {{cimhost::Request::getInstance(pathOf(7)), 1}};
+}
+
+Requests modification(int number, bool) {
+    return {{bench::modification(pathOf(7), lessor(number))}};
+}
+
+Requests creation(int number, bool isGated) {
+    if (isGated) {
+        return {{cimhost::Request::createInstance(newPath(), {newPath(), {lessor(number)}}), 1}};
+    }
+    return {{bench::creation(newPath()), 1}, {bench::modification(newPath(), lessor(number))}};
+}
+
+Requests deletion() {
+    return {{cimhost::Request::deleteInstance(newPath())}};
+}
+
+constexpr Operation operations[] = {
+    {"read", read, noRequests},
+    {"modification", modification, noRequests},
+    {"creation with a value", creation, deletion},
+};
+
+void perform(bench::Environment& environment, const bench::Interfaces& interfaces, const Requests& requests) {
+    for (const bench::ExpectedRequest& each : requests) {
+        bench::requireExpected(each, bench::perform(environment.broker(), each.request, interfaces));
+    }
+}
+
+void measure(bench::Environment& environment, const Case& tested, const Operation& operation, int count) {
     syncs = Syncs::real;
     const auto entry = tested.isGated ? bench::ProviderEntry::ofGate() : bench::ProviderEntry::ofProvider();
     const bench::Interfaces interfaces = environment.loadBoth(leases, entry);
     syncs = tested.syncs;
     std::vector<double> values;
-    for (int index = -2; index < changes; ++index) {
-        const bench::ExpectedRequest expected = modification(index + 2);
-        const double time = timeOf([&] {
-            bench::requireExpected(expected, bench::perform(environment.broker(), expected.request, interfaces));
-        });
+    int timedSyncs = 0;
+    for (int index = -2; index < count; ++index) {
+        const Requests timed = operation.timed(index + 2, tested.isGated);
+        const int syncsBefore = syncCount;
+        const double time = timeOf([&] { perform(environment, interfaces, timed); });
         if (index >= 0) {
             values.push_back(time);  // without the first two, which also create the saved copies
-        } else {
-            syncCount = 0;
+            timedSyncs += syncCount - syncsBefore;
         }
+        perform(environment, interfaces, operation.after());
     }
     syncs = Syncs::real;
-    std::printf("%-34s %10.0f %8.1f\n", tested.name, median(values), static_cast<double>(syncCount) / changes);
+    std::printf("%-24s %-28s %8.0f %8.1f\n", operation.name, tested.name, median(values),
+                static_cast<double>(timedSyncs) / count);
 }
 
-void run(int changes) {
+void run(int count) {
     bench::Environment environment;
-    std::printf("%-34s %10s %8s\n", "modification of one of 100 leases", "us", "syncs");
-    for (const Case& each :
-         {Case{"provider alone", false, Syncs::real}, Case{"gate, syncs omitted", true, Syncs::omitted},
-          Case{"gate", true, Syncs::real}, Case{"gate, each sync takes 1 ms", true, Syncs::slow}}) {
-        measure(environment, each, changes);
+    std::printf("%-24s %-28s %8s %8s\n", "one among 100 leases", "", "us", "syncs");
+    for (const Operation& operation : operations) {
+        for (const Case& each :
+             {Case{"provider alone", false, Syncs::real}, Case{"gate, syncs omitted", true, Syncs::omitted},
+              Case{"gate", true, Syncs::real}, Case{"gate, each sync takes 1 ms", true, Syncs::slow}}) {
+            measure(environment, each, operation, count);
+        }
     }
-    std::printf("%-34s %10.0f\n", "one sync on this disk", syncTime(environment.agent().data(), changes));
     environment.unload();
+    std::printf("%-53s %8.0f\n", "one sync on this disk", syncTime(environment.agent().data(), count));
 }
 
 }  // namespace
@@ -121,13 +177,13 @@ extern "C" __attribute__((visibility("default"))) int fsync(int file) {
 }
 
 int main(int count, char** arguments) {
-    const int changes = count > 1 ? std::atoi(arguments[1]) : 500;
-    if (changes < 1 || count > 2) {
-        std::fputs("Usage: durability_benchmark [CHANGES]\n", stderr);
+    const int requests = count > 1 ? std::atoi(arguments[1]) : 500;
+    if (requests < 1 || count > 2) {
+        std::fputs("Usage: durability_benchmark [REQUESTS]\n", stderr);
         return 2;
     }
     try {
-        run(changes);
+        run(requests);
     } catch (const std::exception& failure) {
         std::fprintf(stderr, "durability_benchmark: %s\n", failure.what());
         return 1;

@@ -4,8 +4,7 @@
 
 namespace durable {
 
-/** The number of this process, also after a fork. Asks the kernel only once per process, since each request needs it.
- */
+/** The id of this process, also after a fork. Asks the kernel only once per process: each request needs the id. */
 pid_t currentProcess() noexcept;
 
 }  // namespace durable

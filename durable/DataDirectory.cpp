@@ -72,8 +72,36 @@ bool DataDirectory::open() {
 }
 
 void DataDirectory::close() {
+    if (isOwner()) {
+        finish();
+    }
     lock.release();
+    owner = 0;
     wereStored = {};
+}
+
+std::array<std::optional<std::size_t>, recordFileCount> DataDirectory::recordCounts() const {
+    std::array<std::optional<std::size_t>, recordFileCount> counts;
+    const std::vector<RecordFile> files = recordFilesIn(path());
+    for (std::size_t index = 0; index < counts.size(); ++index) {
+        try {
+            counts[index] = RecordFile::promisedIn(files[index].content().value_or(std::string())).value_or(0);
+        } catch (const std::system_error&) {
+            counts[index] = std::nullopt;
+        }
+    }
+    return counts;
+}
+
+/** Without effect if a file cannot be read or written: then its copies stay in use. */
+void DataDirectory::finish() const {
+    try {
+        for (const RecordFile& file : recordFilesIn(path())) {
+            file.finish();
+        }
+    } catch (const std::exception&) {
+        return;
+    }
 }
 
 bool DataDirectory::hasLostFiles() const {

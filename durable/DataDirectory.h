@@ -3,6 +3,8 @@
 #include <sys/types.h>
 
 #include <array>
+#include <cstddef>
+#include <optional>
 #include <string>
 
 #include "CurrentProcess.h"
@@ -31,10 +33,14 @@ public:
      */
     bool open();
 
+    /** The number of records of each record file: 0 if there is no file or no number, none if it cannot be read. */
+    std::array<std::optional<std::size_t>, recordFileCount> recordCounts() const;
+
     /** Whether a record file that was there is gone with its copies: then its records are only in memory. */
     bool hasLostFiles() const;
 
-    /** Releases the lock. Called when the provider is unloaded for the last time. */
+    /** Ends the use of the saved copies, and releases the lock. Called when the provider is unloaded for the last time.
+     */
     void close();
 
     /** The result of acquire(). */
@@ -61,6 +67,7 @@ private:
     bool exists() const;
     DirectoryLock::Result acquireLock();
     void recover() const;
+    void finish() const;
     bool needRecovery() const;
     Stamp stamp() const;
     void remember(const Stamp& stamp);

@@ -43,14 +43,21 @@ DirectoryLock::State stateAfter(int error) {
 }
 
 /**
+ * Whether the file must not be written. A user of the directory could otherwise let a process of root change a file
+ * elsewhere, to which that user has added the name "owner".
+ */
+bool isForeign(int descriptor) {
+    struct stat file {};
+    return fstat(descriptor, &file) == 0 && (!S_ISREG(file.st_mode) || file.st_nlink > 1);
+}
+
+/**
  * Lets all users lock the file who may write to the directory, also if this process is of root. Another user's file
- * keeps its mode, and a file that has another name too, its owner.
+ * keeps its mode.
  */
 void shareWithUsersOf(const std::string& directory, int descriptor) {
     struct stat found {};
-    struct stat file {};
-    const bool isShared = stat(directory.c_str(), &found) == 0 && fstat(descriptor, &file) == 0 &&
-                          fchmod(descriptor, found.st_mode & 0666U) == 0 && file.st_nlink == 1 &&
+    const bool isShared = stat(directory.c_str(), &found) == 0 && fchmod(descriptor, found.st_mode & 0666U) == 0 &&
                           fchown(descriptor, found.st_uid, found.st_gid) == 0;
     static_cast<void>(isShared);
 }
@@ -65,6 +72,10 @@ DirectoryLock::Result DirectoryLock::acquire(const std::string& directory) {
     release();  // inherited from the parent process, or removed from the directory
     descriptor = open(path.c_str(), O_RDWR | O_CREAT | O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK, 0644);
     const bool isOpen = descriptor >= 0;
+    if (isOpen && isForeign(descriptor)) {
+        release();
+        return {State::denied, path + ": " + "It is not a regular file, or has another name too. Remove it"};
+    }
     const int error = isOpen ? tryLock(descriptor) : errno;
     if (error == 0) {
         process = currentProcess();
@@ -105,8 +116,7 @@ void DirectoryLock::writeOwner() const {
     static_cast<void>(isWritten);  // the lock holds without it
 }
 
-/** The process id is from the system or, for an owner in another container, from the file; the name is from the file.
- */
+/** The process id is from the system or, for an owner in another container, from the file, as is the name. */
 std::string DirectoryLock::ownerOf(const std::string& path) const {
     struct flock lock = lockOfFile();
     const bool isKnown = fcntl(descriptor, F_GETLK, &lock) == 0 && lock.l_type != F_UNLCK && lock.l_pid > 0;

@@ -19,7 +19,7 @@ public:
         held,      ///< since an earlier call
         acquired,  ///< by this call
         heldByOther,
-        denied,       ///< this process must not write the file, or the system failed
+        denied,       ///< this process must not write the file, it has another name too, or the system failed
         unavailable,  ///< the directory is missing, or its file system has no locks
     };
 

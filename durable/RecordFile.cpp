@@ -10,7 +10,6 @@
 #include <cstdint>
 #include <ctime>
 #include <iterator>
-#include <sstream>
 #include <stdexcept>
 #include <system_error>
 
@@ -22,8 +21,11 @@ namespace {
 
 constexpr struct {
     const char* fileName;
-    std::size_t linesPerRecord;
-} formats[recordFileCount] = {{"Lease.dat", 13}, {"Warranty.dat", 4}};
+    std::string_view newRecord;
+} formats[recordFileCount] = {
+    {"Lease.dat", "\n*\n00000000000000.000000-000\n0\n0\n0\n0\n0\n*\n*\n*\n*\n0\n"},
+    {"Warranty.dat", "\n*\n00000000000000.000000-000\n0\n"},
+};
 
 /** The content without the white space at its beginning, which the provider skips. */
 std::string_view withoutLeadingSpace(std::string_view content) {
@@ -33,24 +35,6 @@ std::string_view withoutLeadingSpace(std::string_view content) {
 /** The number of lines that end. */
 std::size_t endedLinesIn(std::string_view content) {
     return static_cast<std::size_t>(std::count(content.begin(), content.end(), '\n'));
-}
-
-/** The words of a file, at which the provider splits it. */
-std::vector<std::string> wordsIn(std::string_view content) {
-    std::istringstream stream{std::string(content)};
-    return {std::istream_iterator<std::string>(stream), std::istream_iterator<std::string>()};
-}
-
-std::string withoutLeadingZeros(const std::string& word) {
-    const bool isNumber = word.find_first_not_of("0123456789", word[0] == '+' ? 1 : 0) == std::string::npos;
-    return isNumber ? word.substr(std::min(word.find_first_not_of("+0"), word.size() - 1)) : word;
-}
-
-/** Whether the provider, which has read a word, may write it as another one. */
-bool mayBecome(const std::string& read, const std::string& written) {
-    constexpr std::string_view noDate = "00000000000000.000000-000";
-    return withoutLeadingZeros(read) == withoutLeadingZeros(written) || (read.size() == 1 && written == "*") ||
-           (read.size() < noDate.size() && written == noDate);
 }
 
 bool endsWith(std::string_view content, std::string_view end) {
@@ -69,16 +53,17 @@ std::string timeOf(const std::string& path) {
 
 }  // namespace
 
-RecordFile::RecordFile(const std::string& directory, const char* fileName, std::size_t linesPerRecord)
+RecordFile::RecordFile(const std::string& directory, const char* fileName, std::string_view newRecord)
     : name(fileName),
       file(resolvedPath(directory + name)),
       damaged(file + ".damaged"),
       copies(file),
-      lines(linesPerRecord) {}
+      endOfNewRecord(newRecord),
+      lines(endedLinesIn(newRecord)) {}
 
 std::optional<std::string> RecordFile::content() const {
-    auto found = readFile(file);
-    return found ? std::optional<std::string>(copies.withoutLastLine(*std::move(found))) : std::nullopt;
+    const auto found = readFile(file);
+    return found ? std::optional<std::string>(copies.withoutLastLine(*found)) : std::nullopt;
 }
 
 std::optional<std::size_t> RecordFile::promisedIn(std::string_view content) {
@@ -101,16 +86,9 @@ bool RecordFile::isComplete(std::string_view content) const {
     return promised && !hasHoles && hasEnd && presentIn(content) == *promised;
 }
 
-bool RecordFile::addsOneRecord(std::string_view content, std::string_view former) const {
-    if (former.empty()) {
-        return false;
-    }
-    const std::size_t count = promisedIn(former).value_or(0);
-    const std::vector<std::string> before = wordsIn(former);
-    const std::vector<std::string> now = wordsIn(content);
-    const std::size_t size = std::min({1 + count * lines, before.size(), now.size()});
-    const auto end = before.begin() + static_cast<std::ptrdiff_t>(size);
-    return promisedIn(content) == count + 1 && std::equal(before.begin() + 1, end, now.begin() + 1, mayBecome);
+bool RecordFile::addsNewRecord(std::string_view content, std::string_view former) const {
+    return !former.empty() && promisedIn(content) == promisedIn(former).value_or(0) + 1 &&
+           endsWith(content, endOfNewRecord);
 }
 
 SavedCopies::Copy RecordFile::savedCopy() const {
@@ -119,32 +97,41 @@ SavedCopies::Copy RecordFile::savedCopy() const {
     return copy;
 }
 
-std::string RecordFile::prepare(const std::string& current, bool hasSteps) const {
+std::string RecordFile::prepare(const std::string& current) const {
+    return save(current, true);
+}
+
+std::string RecordFile::save(const std::string& current, bool isInUse) const {
     const SavedCopies::Copy copy = savedCopy();
     const bool isNew = current.empty() && copy.content.empty();
     const std::string records = isComplete(current) ? current : isNew ? "0\n" : copy.content;
     if (isNew) {
         createFile(file, 0666);
     }
-    if (!records.empty() && (records != copy.content || copy.isUnfinished || hasSteps)) {
-        copies.save(records, hasSteps);
+    if (!records.empty() && (records != copy.content || isInUse != copy.isInUse)) {
+        copies.save(records, isInUse);
     }
     return records;
 }
 
 void RecordFile::commit(std::string_view written) const {
     syncFile(file);
-    copies.save(written, false);
+    copies.save(written, true);
 }
 
 void RecordFile::restore(const std::string& before) const {
-    const bool isRestored = content() == before;
-    const SavedCopies::Copy copy = savedCopy();
-    if (copy.content != before || (isRestored && copy.isUnfinished)) {
-        copies.save(before, false);
+    if (savedCopy().content != before) {
+        copies.save(before, true);
     }
-    if (!isRestored) {
+    if (content() != before) {
         copies.restoreLatest();
+    }
+}
+
+void RecordFile::finish() const {
+    const SavedCopies::Copy copy = savedCopy();
+    if (copy.isInUse && content() == copy.content) {
+        copies.save(copy.content, false);
     }
 }
 
@@ -159,7 +146,7 @@ std::string RecordFile::defect() const {
     }
     const SavedCopies::Copy copy = savedCopy();
     const bool isRestored = current.size() != found->size();
-    const bool isUnfinished = !isRestored && copy.isUnfinished && addsOneRecord(current, copy.content);
+    const bool isUnfinished = !isRestored && copy.isInUse && addsNewRecord(current, copy.content);
     return isUnfinished ? name + " held an unfinished change." : "";
 }
 
@@ -211,7 +198,7 @@ std::string RecordFile::recover() const {
 }
 
 void RecordFile::replace(std::string_view records) const {
-    prepare(content().value_or(std::string()), false);
+    save(content().value_or(std::string()), false);
     replaceFile(file, records, file);
     syncDirectoryOf(file);
 }
@@ -226,7 +213,7 @@ std::string RecordFile::countsOf(std::string_view content) const {
 std::vector<RecordFile> recordFilesIn(const std::string& directory) {
     std::vector<RecordFile> files;
     for (const auto& each : formats) {
-        files.emplace_back(directory, each.fileName, each.linesPerRecord);
+        files.emplace_back(directory, each.fileName, each.newRecord);
     }
     return files;
 }
@@ -237,7 +224,7 @@ RecordFile recordFileIn(const std::string& directory, std::string_view fileName)
     if (found == std::end(formats)) {
         throw std::invalid_argument(std::string(fileName));
     }
-    return {directory, found->fileName, found->linesPerRecord};
+    return {directory, found->fileName, found->newRecord};
 }
 
 }  // namespace durable

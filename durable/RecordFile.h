@@ -24,8 +24,8 @@ namespace durable {
  */
 class RecordFile {
 public:
-    /** @param linesPerRecord after the first line, which is the number of records */
-    RecordFile(const std::string& directory, const char* fileName, std::size_t linesPerRecord);
+    /** @param newRecord the lines of a record without values, from the end of its identifier */
+    RecordFile(const std::string& directory, const char* fileName, std::string_view newRecord);
 
     /** The path; if NAME is a symbolic link, of its target. */
     const std::string& path() const { return file; }
@@ -44,12 +44,13 @@ public:
 
     /**
      * Ensures that the latest copy has the current records: those of the file or, if that is incomplete, of the
-     * existing copy. A missing or empty file without a copy has none, and is created.
+     * existing copy. A missing or empty file without a copy has none, and is created. From then until finish(), the
+     * copies are in use: recover() discards a record without values that was added since, because the provider writes
+     * such a record before its values.
      * @param current the content of the file; empty if there is none
-     * @param hasSteps whether the change writes the file more than once; recover() discards its intermediate states
      * @return what restore() needs; empty for an incomplete file without a copy
      */
-    std::string prepare(const std::string& current, bool hasSteps) const;
+    std::string prepare(const std::string& current) const;
 
     /**
      * Writes the file to the disk, then its records to a copy. After that the change may be answered.
@@ -59,6 +60,9 @@ public:
 
     /** Restores the file after a change. @param before the result of prepare(), not empty */
     void restore(const std::string& before) const;
+
+    /** Marks the copies as no longer in use, if they have the records of the file. */
+    void finish() const;
 
     /** A sentence about a file that is missing, incomplete or has an intermediate state; empty for another one. */
     std::string defect() const;
@@ -88,16 +92,16 @@ public:
 
     /**
      * Replaces the content of a file without defect: at any time, it has the old or the new records. Until the next
-     * change, the saved copy has the old ones.
+     * change, the saved copy has the old ones, and is not in use.
      */
     void replace(std::string_view records) const;
 
 private:
-    /**
-     * Whether a content has the records of another one and one more at its end, as while a record is created. The
-     * provider may have written the records in another form than it has read.
-     */
-    bool addsOneRecord(std::string_view content, std::string_view former) const;
+    /** The same as prepare(). @param isInUse whether changes follow */
+    std::string save(const std::string& current, bool isInUse) const;
+
+    /** Whether a content has one more record than another one, without values at its end. */
+    bool addsNewRecord(std::string_view content, std::string_view former) const;
 
     std::string countsOf(std::string_view content) const;
 
@@ -105,6 +109,7 @@ private:
     std::string file;
     std::string damaged;
     SavedCopies copies;
+    std::string_view endOfNewRecord;
     std::size_t lines;  ///< per record
 };
 

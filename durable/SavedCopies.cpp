@@ -16,34 +16,36 @@ namespace {
 
 constexpr std::string_view beginningOfLastLine = "saved copy ";
 
-/** The position of the last line of a copy; the end if there is none. */
-std::size_t lastLineOf(const std::string& content) {
-    constexpr std::size_t maximumSize = 512;
-    const std::size_t start = content.size() - std::min(content.size(), maximumSize);
-    const std::size_t found = std::string_view(content).substr(start).rfind(beginningOfLastLine);
-    return found == std::string_view::npos ? content.size() : start + found;
+/** Removes the end of a string if it has that end. */
+bool removeEnd(std::string_view& content, std::string_view end) {
+    const std::size_t start = content.size() - std::min(content.size(), end.size());
+    const bool hasEnd = content.substr(start) == end;
+    content.remove_suffix(hasEnd ? end.size() : 0);
+    return hasEnd;
 }
 
 }  // namespace
 
-std::string SavedCopies::lastLine(const Copy& copy) const {
-    return std::string(beginningOfLastLine) + std::to_string(copy.number) + " of " + name +
-           (copy.isUnfinished ? " before an unfinished change" : "") + "\n";
+std::string SavedCopies::lastLineAfterNumber(bool isInUse) const {
+    return " of " + name + (isInUse ? ", in use" : "") + "\n";
 }
 
 /** The parts of a copy's content, without its path. Empty if it is not complete. */
-SavedCopies::Copy SavedCopies::parse(std::string content) const {
-    const std::size_t start = lastLineOf(content);
-    const char* number = content.data() + std::min(start + beginningOfLastLine.size(), content.size());
+SavedCopies::Copy SavedCopies::parse(const std::string& content) const {
     Copy copy;
-    std::from_chars(number, content.data() + content.size(), copy.number);
-    copy.isUnfinished = content.substr(start) != lastLine(copy);
+    std::string_view records = content;
+    copy.isInUse = removeEnd(records, lastLineAfterNumber(true));
     const bool hasHoles = content.find('\0') != std::string::npos;  // left by a file system that lost power
-    if (hasHoles || content.substr(start) != lastLine(copy)) {
+    if (hasHoles || (!copy.isInUse && !removeEnd(records, lastLineAfterNumber(false)))) {
         return {};
     }
-    content.resize(start);
-    copy.content = std::move(content);
+    const std::string_view number = records.substr(records.find_last_not_of("0123456789") + 1);
+    const bool isNumber = std::from_chars(number.begin(), number.end(), copy.number).ec == std::errc();
+    records.remove_suffix(number.size());
+    if (!isNumber || !removeEnd(records, beginningOfLastLine)) {
+        return {};
+    }
+    copy.content = records;
     return copy;
 }
 
@@ -53,11 +55,9 @@ SavedCopies::Copy SavedCopies::read(const std::string& path) const {
     return copy;
 }
 
-std::string SavedCopies::withoutLastLine(std::string content) const {
-    const std::size_t start = lastLineOf(content);
-    const bool isCopy = start != content.size() && !parse(content).content.empty();
-    content.resize(isCopy ? start : content.size());
-    return content;
+std::string SavedCopies::withoutLastLine(const std::string& content) const {
+    Copy copy = parse(content);
+    return copy.content.empty() ? content : std::move(copy.content);
 }
 
 /** Both copies, the older one first. */
@@ -69,13 +69,15 @@ std::array<SavedCopies::Copy, 2> SavedCopies::byAge() const {
     return copies;
 }
 
-void SavedCopies::save(std::string_view content, bool isUnfinished) const {
+void SavedCopies::save(std::string_view content, bool isInUse) const {
     const auto [older, last] = byAge();
     if (older.content.empty()) {  // then its name may not be on the disk
         createFile(older.path, 0600);
         syncDirectoryOf(older.path);
     }
-    overwriteFile(older.path, std::string(content) + lastLine({{}, {}, last.number + 1, isUnfinished}), file);
+    const std::string lastLine =
+        std::string(beginningOfLastLine) + std::to_string(last.number + 1) + lastLineAfterNumber(isInUse);
+    overwriteFile(older.path, std::string(content) + lastLine, file);
 }
 
 void SavedCopies::restoreLatest() const {

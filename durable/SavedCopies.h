@@ -18,9 +18,9 @@ class SavedCopies {
 public:
     struct Copy {
         std::string path{};
-        std::string content{};      ///< without the last line; empty if there is no complete copy
-        std::uint64_t number = 0;   ///< one more than that of the copy before
-        bool isUnfinished = false;  ///< whether a change that writes the file more than once has begun since
+        std::string content{};     ///< without the last line; empty if there is no complete copy
+        std::uint64_t number = 0;  ///< one more than that of the copy before
+        bool isInUse = false;      ///< whether a process may have begun another change since
     };
 
     explicit SavedCopies(const std::string& itsFile)
@@ -29,10 +29,10 @@ public:
     Copy latest() const { return byAge()[1]; }
 
     /** The content without the last line of a copy, which a restored file may still have. */
-    std::string withoutLastLine(std::string content) const;
+    std::string withoutLastLine(const std::string& content) const;
 
     /** Writes a copy to the disk. It has the mode, owner and group of the file. */
-    void save(std::string_view content, bool isUnfinished) const;
+    void save(std::string_view content, bool isInUse) const;
 
     /** Makes the latest copy the file, which needs no disk space. Removes the other one if possible. */
     void restoreLatest() const;
@@ -41,10 +41,10 @@ public:
     void finishRestoring() const;
 
 private:
-    Copy parse(std::string content) const;
+    Copy parse(const std::string& content) const;
     Copy read(const std::string& path) const;
     std::array<Copy, 2> byAge() const;
-    std::string lastLine(const Copy& copy) const;
+    std::string lastLineAfterNumber(bool isInUse) const;
 
     std::string file;
     std::string name;

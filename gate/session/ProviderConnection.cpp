@@ -3,6 +3,7 @@
 #include <cxxabi.h>
 #include <dlfcn.h>
 
+#include <algorithm>
 #include <chrono>
 #include <exception>
 #include <thread>
@@ -24,10 +25,16 @@ constexpr std::chrono::seconds drainTimeout{5};
 constexpr std::chrono::seconds waitTimeout{5};
 constexpr std::chrono::milliseconds pollInterval{10};
 
+/** How long a request waits for newer records if it may use older ones. A file's time has a resolution of 10 ms. */
+constexpr std::chrono::milliseconds newerTimeout{50};
+
+/** The classes of the record files, in their order. */
+constexpr std::array<const char*, durable::recordFileCount> recordClasses{"VELKO_Lease", "VELKO_Warranty"};
+
 /** Releases the lock while the condition holds, but not much longer than the timeout. */
 template <class Condition>
-void waitWhile(LockGuard& guard, Condition condition) {
-    const auto end = std::chrono::steady_clock::now() + waitTimeout;
+void waitWhile(LockGuard& guard, std::chrono::milliseconds timeout, Condition condition) {
+    const auto end = std::chrono::steady_clock::now() + timeout;
     while (condition() && std::chrono::steady_clock::now() < end) {
         guard.releaseFor([] { std::this_thread::sleep_for(pollInterval); });
     }
@@ -106,7 +113,7 @@ void ProviderConnection::connect(const CMPIBroker* manager) {
 
 void ProviderConnection::requireOwner(LockGuard& guard) {
     durable::DataDirectory::Ownership ownership{};
-    waitWhile(guard, [&] {
+    waitWhile(guard, waitTimeout, [&] {
         ownership = theDirectory.acquire();
         return ownership.isOtherProcess;
     });
@@ -121,9 +128,13 @@ bool ProviderConnection::needsLoading() const {
 
 void ProviderConnection::requireCurrent(LockGuard& guard, bool mayBeOlder) {
     bool isWaiting = false;
-    waitWhile(guard, [&] { return isWaiting = needsLoading() && (upCalls != 0 || !load()); });
+    const auto update = [&] { return isWaiting = needsLoading() && (upCalls != 0 || !load()); };
+    waitWhile(guard, newerTimeout, update);
     if (isWaiting && mayBeOlder && library.isLoaded() && !isOutdated) {
         return;
+    }
+    if (isWaiting) {
+        waitWhile(guard, waitTimeout, update);
     }
     if (isWaiting && upCalls != 0) {
         fail(CMPI_RC_ERR_FAILED, "The provider waits for the object manager and cannot be loaded again. Try again.");
@@ -146,14 +157,38 @@ bool ProviderConnection::load() {
     }
     isOutdated = true;
     unload();
+    counts = theDirectory.recordCounts();
     library.load();
     shutdownAtExit.registerAgain();
     if (!theDirectory.hasChanged()) {
         createInterfaces();
         isOutdated = false;
         verified = 0;
+        read = 0;
     }
     return !isOutdated;
+}
+
+bool ProviderConnection::hasRead(const Class& owner, std::optional<std::size_t> count) {
+    const auto* const found = std::find_if(recordClasses.begin(), recordClasses.end(),
+                                           [&](const char* name) { return sameName(name, owner.name); });
+    if (found == recordClasses.end() || (read & bitOf(owner)) != 0) {
+        return true;
+    }
+    if (!count) {
+        return false;
+    }
+    const auto index = static_cast<std::size_t>(found - recordClasses.begin());
+    if (!counts[index]) {  // the gate could not read the file, but the provider may have
+        counts[index] = theDirectory.recordCounts()[index];
+    }
+    if (count != counts[index]) {
+        setOutdated();
+        fail(CMPI_RC_ERR_FAILED, std::string("The provider could not read the records of ") + owner.name +
+                                     "; see the agent's log at level 3000. It reads them again; repeat the request.");
+    }
+    read |= bitOf(owner);
+    return true;
 }
 
 void ProviderConnection::unload() {

@@ -1,11 +1,13 @@
 #pragma once
 
+#include <array>
 #include <cstddef>
 #include <mutex>
 #include <optional>
 
 #include "ProviderLibrary.h"
 #include "RequestLock.h"
+#include "durable/RecordFile.h"
 #include "gate/cmpi/Schema.h"
 #include "gate/cmpi/WrappedBroker.h"
 
@@ -54,13 +56,22 @@ public:
      * Loads the provider if it is not loaded or outdated. Releases the lock until no other request is in an up-call of
      * the provider, since it cannot be unloaded before, and until no other process writes the files. Fails with
      * CMPI_RC_ERR_FAILED if that takes too long, or if a file was removed, whose records would be lost.
-     * @param mayBeOlder whether the provider may have older records instead if that takes too long
+     * @param mayBeOlder whether the provider may have older records: then it waits for newer ones only briefly
      */
     void requireCurrent(LockGuard& guard, bool mayBeOlder);
 
     /** @name Whether a class's table has been compared with its file since the provider was loaded */
     bool isVerified(const Class& owner) const { return (verified & bitOf(owner)) != 0; }
     void setVerified(const Class& owner) { verified |= bitOf(owner); }
+
+    /**
+     * Whether the provider has read the record file of a class, or the class has none. The provider does not report
+     * that it could not read. So its records are counted once: fails with CMPI_RC_ERR_FAILED unless they are as many as
+     * the file had when the provider was loaded.
+     * @param count the number of the provider's records; none if they are not counted yet
+     * @return false if they have to be counted
+     */
+    bool hasRead(const Class& owner, std::optional<std::size_t> count);
     ///@}
 
 private:
@@ -78,8 +89,10 @@ private:
 
     ProviderLibrary library{};
     bool isOutdated = false;
-    std::size_t verified = 0;  ///< a bit of each class
-    std::size_t upCalls = 0;   ///< requests in the provider that have released the lock
+    std::size_t verified = 0;                                                   ///< a bit of each class
+    std::size_t read = 0;                                                       ///< the same
+    std::array<std::optional<std::size_t>, durable::recordFileCount> counts{};  ///< when the provider was loaded
+    std::size_t upCalls = 0;  ///< requests in the provider that have released the lock
     std::optional<WrappedBroker> wrapped{};
     CMPIInstanceMI* instances = nullptr;
     CMPIAssociationMI* associations = nullptr;

@@ -102,22 +102,41 @@ ProviderAnswer ProviderSession::read(Interface* interface, const LocalObject& pa
 
 Paths ProviderSession::names(const Class& owner) const {
     const LocalObject path(nameSpaceOf(request.path), owner);
-    return read<&CMPIInstanceMIFT::enumerateInstanceNames>(theConnection.instanceInterface(), path).paths;
+    Paths paths = read<&CMPIInstanceMIFT::enumerateInstanceNames>(theConnection.instanceInterface(), path).paths;
+    theConnection.hasRead(owner, paths.size());
+    return paths;
+}
+
+/** Fails unless the provider has read the records of a class. Lists them once after the provider was loaded. */
+void ProviderSession::requireRead(const Class& owner) const {
+    if (!theConnection.hasRead(owner, std::nullopt)) {
+        names(owner);
+    }
+}
+
+/** The same for the class that an association connects with computers. */
+void ProviderSession::requireElementsRead(const Class& association) const {
+    for (const Property& end : association) {
+        requireRead(*findClass(end.referenceClass));
+    }
 }
 
 Instances ProviderSession::instances(const Class& owner) const {
+    requireRead(owner);
     const LocalObject path(nameSpaceOf(request.path), owner);
     return read<&CMPIInstanceMIFT::enumerateInstances>(theConnection.instanceInterface(), path, allProperties)
         .instances;
 }
 
 Paths ProviderSession::associatorNames(const LocalObject& computer, const Class& association) const {
+    requireElementsRead(association);
     return read<&CMPIAssociationMIFT::associatorNames>(theConnection.associationInterface(), computer, association.name,
                                                        any, any, any)
         .paths;
 }
 
 Instances ProviderSession::associators(const LocalObject& computer, const Class& association) const {
+    requireElementsRead(association);
     return read<&CMPIAssociationMIFT::associators>(theConnection.associationInterface(), computer, association.name,
                                                    any, any, any, allProperties)
         .instances;
@@ -129,6 +148,7 @@ const CMPIInstance* ProviderSession::find(const LocalObject& keys, const Class& 
         const CMPIInstance* agent = firstOf(instances(owner));
         return agent != nullptr && hasKeys(agent, keys.path(), owner) ? agent : nullptr;
     }
+    requireRead(owner);
     return firstOf(
         read<&CMPIInstanceMIFT::getInstance>(theConnection.instanceInterface(), keys, allProperties).instances);
 }

@@ -56,8 +56,8 @@ struct ClientRequest {
  * An object manager may crash while a client's object is read: SFCB does for a string that was sent as an integer.
  * Begin the session before you read a client's keys and values: then no data file is being written.
  *
- * The provider logs its errors and returns success. Where an error is visible, since the answer was not ended, it is a
- * Failure here; a change has to be checked afterwards.
+ * The provider logs its errors and returns success. Where an error is visible, since the answer was not ended or has
+ * another number of records than the file, it is a Failure here; a change has to be checked afterwards.
  */
 class ProviderSession {
 public:
@@ -105,6 +105,9 @@ public:
     }
 
 private:
+    void requireRead(const Class& owner) const;
+    void requireElementsRead(const Class& association) const;
+
     template <auto function, class Interface, class... Arguments>
     ProviderAnswer call(Interface* interface, const LocalObject& path, Arguments... arguments) const;
     template <auto function, class Interface, class... Arguments>

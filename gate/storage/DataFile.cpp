@@ -159,10 +159,10 @@ std::string DataFile::firstIdentifier(const std::string& content) {
     return words ? identifier : std::string();
 }
 
-void DataFile::begin(FileState& before, bool hasSteps) const {
+void DataFile::begin(FileState& before) const {
     before.restorable = before.content;
     if (hasRecords) {
-        before.restorable = onFiles([&] { return recordFileOf(*this).prepare(before.content, hasSteps); });
+        before.restorable = onFiles([&] { return recordFileOf(*this).prepare(before.content); });
     }
 }
 

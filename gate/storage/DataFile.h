@@ -51,8 +51,8 @@ struct DataFile {
 
     /** @name Storing a change: begin(), the provider's writing, then commit() or rollBack() */
     ///@{
-    /** Makes the current state restorable. @param hasSteps whether the change writes the file more than once */
-    void begin(FileState& before, bool hasSteps) const;
+    /** Makes the current state restorable. */
+    void begin(FileState& before) const;
 
     /**
      * Syncs the file and the saved copy. Fails if the file is incomplete, or must differ from a state but does not.

@@ -35,11 +35,10 @@ FileState Transaction::open(std::size_t growth) const {
 /**
  * Calls `change(before)`, which makes a change, checks it and commits it. If it fails, rolls the change back and passes
  * the failure on, with a note if the file could not be restored.
- * @param hasSteps whether the file is written more than once
  */
 template <class Change>
-void Transaction::run(FileState before, bool hasSteps, Change change) const {
-    file.begin(before, hasSteps);
+void Transaction::run(FileState before, Change change) const {
+    file.begin(before);
     try {
         change(before);
     } catch (Failure& failure) {
@@ -78,7 +77,7 @@ void Transaction::create(const std::string& identifier, const Values& given, con
     const FileState start = open(identifier.size() + 1 + sizeOf(given));
     requireNew(identifier, start.content);
     requireReadOnlyValues(given, start.content);
-    run(start, !given.empty(), [&](const FileState& before) {
+    run(start, [&](const FileState& before) {
         const CMPIInstance* current = session.create(path);
         const Values changes = diff(current, given, false);
         const FileState created = altersFile(file, current, changes) ? file.state() : before;
@@ -92,14 +91,14 @@ void Transaction::create(const std::string& identifier, const Values& given, con
 
 void Transaction::modify(const CMPIInstance* current, const Values& changes) {
     requireRoundTrip(file, changes);
-    run(open(sizeOf(changes)), false, [&](const FileState& before) {
+    run(open(sizeOf(changes)), [&](const FileState& before) {
         apply(current, changes);
         file.commit(before, altersFile(file, current, changes));
     });
 }
 
 void Transaction::remove() {
-    run(open(0), false, [&](const FileState& before) {
+    run(open(0), [&](const FileState& before) {
         session.remove(path);
         file.commit(before, true);
     });

@@ -38,7 +38,7 @@ public:
 private:
     FileState open(std::size_t growth) const;
     template <class Change>
-    void run(FileState before, bool hasSteps, Change change) const;
+    void run(FileState before, Change change) const;
     std::string rollBack(const FileState& before) const;
 
     void apply(const CMPIInstance* current, const Values& changes) const;

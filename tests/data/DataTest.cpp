@@ -268,13 +268,9 @@ TEST_F(DataTest, TheLastLineOfARestoredCopyIsNotARecord) {
 }
 
 TEST_F(DataTest, AMissingFileWithASavedCopyAndAnUnfinishedChangeAreReported) {
-    // The file has one record more than the copy.
-    std::size_t end = 0;
-    for (int line = 0; line < 14; ++line) {
-        end = content.find('\n', end) + 1;
-    }
-    writeFile(dataFile("Lease.dat.saved1"),
-              "1" + content.substr(1, end - 1) + "saved copy 99 of Lease.dat before an unfinished change\n");
+    const std::string newRecord = "new\n*\n00000000000000.000000-000\n0\n0\n0\n0\n0\n*\n*\n*\n*\n0\n";
+    writeFile(dataFile("Lease.dat.saved1"), content + "saved copy 99 of Lease.dat, in use\n");
+    writeFile(leases(), "3" + content.substr(1) + newRecord);
     EXPECT_THAT(run("check"), hasEnded(1, "Lease.dat held an unfinished change."));
     EXPECT_THAT(run("export VELKO_Lease"), hasEnded(1, "Lease.dat held an unfinished change."));
     fs::remove(leases());

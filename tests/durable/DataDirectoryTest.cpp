@@ -115,7 +115,7 @@ TEST_F(DataDirectoryTest, MayNotBeReadWhileAFileWasJustChangedByAnotherProcess) 
 
 TEST_F(DataDirectoryTest, MayNotBeReadWhileAFileIsIncompleteAndAnotherProcessIsTheOwner) {
     const RecordFile warranties = recordFileIn(path, "Warranty.dat");
-    warranties.prepare(oneWarranty, false);
+    warranties.prepare(oneWarranty);
     lockByOther();
     testsupport::writeFile(file(), "1\nW1\n");
     setAge(60);
@@ -149,7 +149,7 @@ TEST_F(DataDirectoryTest, HasChangedForAForkedChildOfItsOwner) {
 TEST_F(DataDirectoryTest, HasLostAFileThatWasThereAndIsGoneWithItsCopies) {
     EXPECT_TRUE(directory.open());
     EXPECT_FALSE(directory.hasLostFiles());
-    recordFileIn(path, "Warranty.dat").prepare(oneWarranty, false);
+    recordFileIn(path, "Warranty.dat").prepare(oneWarranty);
     std::filesystem::remove(file());
     EXPECT_FALSE(directory.hasLostFiles()) << "there is a copy";
     std::filesystem::remove(file().string() + ".saved1");

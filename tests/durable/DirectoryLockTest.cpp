@@ -1,5 +1,6 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
@@ -130,6 +131,29 @@ TEST_F(DirectoryLockTest, IsDeniedToAProcessThatMustNotWriteItsFile) {
     held.release();
     std::filesystem::permissions(directory.path(), std::filesystem::perms(0755));
     EXPECT_EQ(stateOfAnotherUser(), geteuid() == 0 ? State::denied : State::acquired);
+}
+
+TEST_F(DirectoryLockTest, IsDeniedAndWritesNothingIfTheFileHasAnotherName) {
+    const std::filesystem::path other = directory.path() / "other";
+    testsupport::writeFile(other, "content");
+    std::filesystem::permissions(other, std::filesystem::perms(0640));
+    std::filesystem::create_hard_link(other, directory.path() / "owner");
+    const DirectoryLock::Result result = held.acquire(path);
+    EXPECT_EQ(result.state, State::denied);
+    EXPECT_EQ(result.reason, path + "owner: It is not a regular file, or has another name too. Remove it");
+    EXPECT_EQ(testsupport::readFile(other), "content");
+    EXPECT_EQ(std::filesystem::status(other).permissions(), std::filesystem::perms(0640));
+    std::filesystem::remove(directory.path() / "owner");
+    EXPECT_EQ(held.acquire(path).state, State::acquired);
+}
+
+TEST_F(DirectoryLockTest, IsDeniedIfTheFileIsNotRegular) {
+    ASSERT_EQ(mkfifo((path + "owner").c_str(), 0600), 0);
+    EXPECT_EQ(held.acquire(path).state, State::denied);
+    std::filesystem::remove(path + "owner");
+    std::filesystem::create_symlink("other", path + "owner");
+    EXPECT_EQ(held.acquire(path).state, State::denied);
+    EXPECT_FALSE(std::filesystem::exists(path + "other")) << "the link was not followed";
 }
 
 TEST_F(DirectoryLockTest, IsOpenToUsersWhoMayWriteToTheDirectory) {

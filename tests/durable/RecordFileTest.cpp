@@ -30,12 +30,16 @@ std::string records(std::initializer_list<const char*> identifiers) {
     return content;
 }
 
+/** The same and one more record, without values, as while it is created. */
+std::string recordsAndNew(std::initializer_list<const char*> identifiers) {
+    return std::to_string(identifiers.size() + 1) + records(identifiers).substr(1) +
+           "new\n*\n00000000000000.000000-000\n0\n";
+}
+
 class RecordFileTest : public testing::Test {
 protected:
     /** Prepares a change of the current content. */
-    std::string prepare(bool hasSteps = false) const {
-        return file.prepare(file.content().value_or(std::string()), hasSteps);
-    }
+    std::string prepare() const { return file.prepare(file.content().value_or(std::string())); }
 
     fs::path in(const char* name) const { return directory.path() / name; }
 
@@ -174,7 +178,7 @@ TEST_F(RecordFileTest, ASavedCopyOfAnotherClassIsNotUsed) {
         content += "1\n";
     }
     writeFile(in("Lease.dat"), content);
-    leases.prepare(content, false);
+    leases.prepare(content);
     fs::copy_file(in("Lease.dat.saved1"), saved);
     writeFile(path, "2\nW1\n");
     EXPECT_THAT(file.recover(), HasSubstr("no saved copy"));
@@ -245,7 +249,7 @@ TEST_F(RecordFileTest, TheTargetOfASymbolicLinkIsProtected) {
     writeFile(target, records({"W1"}));
     fs::create_symlink(target, path);
     const RecordFile linked = recordFileIn(directory.withSlash(), "Warranty.dat");
-    linked.prepare(records({"W1"}), false);
+    linked.prepare(records({"W1"}));
     writeFile(path, "2\n");
     EXPECT_THAT(linked.recover(), HasSubstr("It was restored"));
     EXPECT_TRUE(fs::is_symlink(path));
@@ -253,16 +257,17 @@ TEST_F(RecordFileTest, TheTargetOfASymbolicLinkIsProtected) {
 }
 
 TEST_F(RecordFileTest, TheCopiesOfATargetWithWordsOfTheirLastLineInItsNameAreUsed) {
-    for (const char* name : {"records before 2026", "before an unfinished change"}) {
+    for (const char* name : {"records of 2026", "saved copy 1", "x of Warranty.dat, in use"}) {
         fs::remove(path);
+        writeFile(in(name), records({"W1"}));
         fs::create_symlink(in(name), path);
         const RecordFile linked = recordFileIn(directory.withSlash(), "Warranty.dat");
-        for (const bool hasSteps : {false, true}) {
-            writeFile(path, records({"W1"}));
-            linked.prepare(records({"W1"}), hasSteps);
-            EXPECT_EQ(linked.savedCopy().content, records({"W1"})) << name;
-            EXPECT_EQ(linked.savedCopy().isUnfinished, hasSteps) << name;
-        }
+        linked.prepare(records({"W1"}));
+        EXPECT_EQ(linked.savedCopy().content, records({"W1"})) << name;
+        EXPECT_TRUE(linked.savedCopy().isInUse) << name;
+        linked.finish();
+        EXPECT_EQ(linked.savedCopy().content, records({"W1"})) << name;
+        EXPECT_FALSE(linked.savedCopy().isInUse) << name;
     }
 }
 
@@ -271,62 +276,80 @@ TEST_F(RecordFileTest, WithoutAnyFileThereIsNothingToRecover) {
     EXPECT_TRUE(fs::is_empty(directory.path()));
 }
 
-TEST_F(RecordFileTest, AnUnfinishedChangeIsNotTakenForAnAnsweredOne) {
+TEST_F(RecordFileTest, AnUnfinishedCreationIsNotTakenForAnAnsweredOne) {
     writeFile(path, records({"W1"}));
-    prepare(true);
-    writeFile(path, records({"W1", "W2"}));
+    prepare();
+    writeFile(path, recordsAndNew({"W1"}));
     EXPECT_TRUE(file.needsRecovery());
     EXPECT_THAT(file.recover(), HasSubstr("held an unfinished change"));
     EXPECT_EQ(readFile(path), records({"W1"}));
     EXPECT_THAT(file.recover(), IsEmpty()) << "it is finished now";
 }
 
-TEST_F(RecordFileTest, AnUnfinishedChangeOfAnEditedFileIsRecognized) {
-    const std::string edited = "\n+01\r\nW1\r\nx\r\n2026\r\n036\r\na later line\r\n";
-    writeFile(path, edited);
-    prepare(true);
-    writeFile(path, "2\nW1\n*\n00000000000000.000000-000\n36\nW2\n*\n00000000000000.000000-000\n0\n");
-    EXPECT_THAT(file.recover(), HasSubstr("held an unfinished change"));
-    EXPECT_EQ(readFile(path), edited);
+TEST_F(RecordFileTest, AnUnfinishedCreationAfterAnEditIsRecognized) {
+    for (const char* number : {"036", "36m"}) {
+        const std::string edited = std::string("\n+01\r\nW1\r\nx\r\n2026\r\n") + number + "\r\na later line\r\n";
+        writeFile(path, edited);
+        prepare();
+        writeFile(path, "2\nW1\n*\n00000000000000.000000-000\n36\nnew\n*\n00000000000000.000000-000\n0\n");
+        EXPECT_THAT(file.recover(), HasSubstr("held an unfinished change"));
+        EXPECT_EQ(readFile(path), edited);
+    }
 }
 
-TEST_F(RecordFileTest, AnotherCompleteFileIsKeptAlthoughAChangeIsUnfinished) {
-    for (const std::string& edited :
-         {records({"W1"}), records({"W1", "W2", "W3"}), records({"W3", "W2"}), records({}), std::string("0"),
-          std::string("2\nW1\nAnother\n20260101000000.000000+000\n12\nW2\n*\n*\n12\n")}) {
+TEST_F(RecordFileTest, AnotherCompleteFileIsKeptAlthoughItsCopiesAreInUse) {
+    for (const std::string& edited : {records({"W1"}), records({"W1", "W2"}), records({"W1", "W2", "W3"}), records({}),
+                                      std::string("0"), recordsAndNew({"W1", "W2"}), recordsAndNew({})}) {
         writeFile(path, records({"W1"}));
-        prepare(true);
+        prepare();
         writeFile(path, edited);
         EXPECT_THAT(file.recover(), IsEmpty()) << edited;
         EXPECT_EQ(readFile(path), edited);
     }
 }
 
-TEST_F(RecordFileTest, ARestoredFileIsKeptAlthoughTheOlderCopyIsOfAnUnfinishedChange) {
-    const std::string complete = records({"W1", "W2"});
-    writeFile(path, complete + "saved copy 8 of Warranty.dat\n");
-    writeFile(saved, records({"W1"}) + "saved copy 7 of Warranty.dat before an unfinished change\n");
+TEST_F(RecordFileTest, ANewRecordWithoutValuesIsKeptIfTheCopiesAreNotInUse) {
+    writeFile(path, records({"W1"}));
+    prepare();
+    file.finish();
+    writeFile(path, recordsAndNew({"W1"}));
+    EXPECT_THAT(file.recover(), IsEmpty());
+    EXPECT_EQ(readFile(path), recordsAndNew({"W1"}));
+}
+
+TEST_F(RecordFileTest, TheCopiesOfAnUnfinishedCreationStayInUse) {
+    writeFile(path, records({"W1"}));
+    prepare();
+    writeFile(path, recordsAndNew({"W1"}));
+    file.finish();
+    EXPECT_TRUE(file.needsRecovery());
+}
+
+TEST_F(RecordFileTest, ARestoredFileIsKeptAlthoughTheOlderCopyIsInUse) {
+    const std::string complete = recordsAndNew({"W1"});
+    writeFile(path, complete + "saved copy 8 of Warranty.dat, in use\n");
+    writeFile(saved, records({"W1"}) + "saved copy 7 of Warranty.dat, in use\n");
     for (int time = 0; time < 2; ++time) {
         EXPECT_THAT(file.recover(), IsEmpty());
         EXPECT_EQ(readFile(path), complete);
     }
 }
 
-TEST_F(RecordFileTest, ReplacedRecordsAreKeptAlthoughAChangeWasNotFinished) {
+TEST_F(RecordFileTest, ReplacedRecordsAreKeptAlthoughTheCopiesWereInUse) {
     writeFile(path, records({"W1"}));
-    prepare(true);
-    file.replace(records({"W1", "W2"}));
+    prepare();
+    file.replace(recordsAndNew({"W1"}));
     EXPECT_THAT(file.recover(), IsEmpty());
-    EXPECT_EQ(readFile(path), records({"W1", "W2"}));
+    EXPECT_EQ(readFile(path), recordsAndNew({"W1"}));
 }
 
-TEST_F(RecordFileTest, ACommittedChangeIsSavedAndFinished) {
+TEST_F(RecordFileTest, ACommittedCreationIsSaved) {
     writeFile(path, records({"W1"}));
-    prepare(true);
-    writeFile(path, records({"W1", "W2"}));
-    file.commit(records({"W1", "W2"}));
+    prepare();
+    writeFile(path, recordsAndNew({"W1"}));
+    file.commit(recordsAndNew({"W1"}));
     EXPECT_THAT(file.recover(), IsEmpty());
-    EXPECT_EQ(file.savedCopy().content, records({"W1", "W2"}));
+    EXPECT_EQ(file.savedCopy().content, recordsAndNew({"W1"}));
 }
 
 TEST_F(RecordFileTest, AChangeIsRolledBackWhateverTheSavedCopyIs) {

@@ -69,9 +69,18 @@ void recordOpening(const char* path, bool existed, bool truncates) {
     }
 }
 
+/** Records data that were written before the present position of a file. */
 void recordWriting(int descriptor, std::string data) {
     if (Recording::events != nullptr && isRecorded(nameOf(descriptor))) {
-        record({Kind::write, inodeOfDescriptor(descriptor), {}, {}, std::move(data)});
+        const auto offset = static_cast<std::size_t>(lseek(descriptor, 0, SEEK_CUR)) - data.size();
+        record({Kind::write, inodeOfDescriptor(descriptor), {}, {}, std::move(data), offset});
+    }
+}
+
+void recordSync(int descriptor) {
+    const std::string name = nameOf(descriptor);
+    if (isRecorded(name)) {
+        record({name == "/" ? Kind::syncNames : Kind::sync, inodeOfDescriptor(descriptor)});
     }
 }
 
@@ -160,11 +169,13 @@ VISIBLE ssize_t writev(int file, const struct iovec* parts, int count) {
 }
 
 VISIBLE int fsync(int file) {
-    const std::string name = nameOf(file);
-    if (isRecorded(name)) {
-        record({name == "/" ? Kind::syncNames : Kind::sync, inodeOfDescriptor(file)});
-    }
+    recordSync(file);
     return 0;  // a real sync would only be slow
+}
+
+VISIBLE int fdatasync(int file) {
+    recordSync(file);
+    return 0;
 }
 
 VISIBLE int rename(const char* from, const char* to) noexcept {
@@ -188,6 +199,14 @@ VISIBLE int truncate(const char* path, off_t size) noexcept {
     const int result = next<int(const char*, off_t)>("truncate")(path, size);
     if (result == 0 && isRecorded(nameOf(std::string(path)))) {
         record({Kind::truncate, inodeOf(std::string(path)), {}, {}, {}, static_cast<std::size_t>(size)});
+    }
+    return result;
+}
+
+VISIBLE int ftruncate(int file, off_t size) noexcept {
+    const int result = next<int(int, off_t)>("ftruncate")(file, size);
+    if (result == 0 && isRecorded(nameOf(file))) {
+        record({Kind::truncate, inodeOfDescriptor(file), {}, {}, {}, static_cast<std::size_t>(size)});
     }
     return result;
 }

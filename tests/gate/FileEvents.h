@@ -19,7 +19,7 @@ struct Event {
     std::string name{};    ///< of a file that was created, renamed or removed
     std::string target{};  ///< new name of a renamed file
     std::string data{};
-    std::size_t size = 0;  ///< after a truncation
+    std::size_t offset = 0;  ///< of a write; the size after a truncation
 };
 
 /** Returns the number that identifies a file; 0 if there is none. */

@@ -143,12 +143,22 @@ TEST_F(ProviderRequestsTest, ADeletionGetsTheRecordBefore) {
     EXPECT_THAT(behindFailure(CMPI_RC_ERR_NOT_FOUND, [&] { return remove("L1"); }), ElementsAre("GetInstance"));
 }
 
+TEST_F(ProviderRequestsTest, TheFirstRequestOfAClassListsItsNames) {
+    unload();
+    EXPECT_THAT(behind([&] { return gate().getInstance(keyedPath(lease, "L1")); }),
+                ElementsAre("EnumInstanceNames", "GetInstance"));
+    EXPECT_THAT(behind([&] { return gate().enumerateInstances(classPath(lease)); }), ElementsAre("EnumInstances"));
+    EXPECT_THAT(behind([&] { return gate().enumerateInstanceNames(classPath(warranty)); }),
+                ElementsAre("EnumInstanceNames"));
+    EXPECT_THAT(behind([&] { return gate().enumerateInstances(classPath(warranty)); }), ElementsAre("EnumInstances"));
+}
+
 TEST_F(ProviderRequestsTest, TheFirstChangeOfAClassListsItsNames) {
     unload();
     EXPECT_THAT(behind([&] { return create("L2"); }), ElementsAre("EnumInstanceNames", "CreateInstance"));
     EXPECT_THAT(behind([&] { return create("L3"); }), ElementsAre("CreateInstance"));
     EXPECT_THAT(behind([&] { return remove(firstNode, warranty); }),
-                ElementsAre("GetInstance", "EnumInstanceNames", "DeleteInstance"));
+                ElementsAre("EnumInstanceNames", "GetInstance", "EnumInstanceNames", "DeleteInstance"));
 }
 
 TEST_F(ProviderRequestsTest, ATraversalFromAComputerIsOneForEachAssociation) {

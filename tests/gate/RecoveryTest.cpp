@@ -5,6 +5,7 @@
 #include <set>
 
 #include "GateFixture.h"
+#include "SimulatedTime.h"
 #include "support/Files.h"
 
 // Recovery of record files before the provider reads them.
@@ -135,6 +136,7 @@ TEST_F(RecoveryTest, AProcessThatMustNotWriteNeitherRestoresNorReadsAnIncomplete
     gate();
     {
         const UnwritableDirectory unwritable(agentEnvironment::dataDirectory());
+        const SimulatedTime waiting;
         EXPECT_THAT(gate().enumerateInstances(classPath(lease)), isRefused(CMPI_RC_ERR_FAILED, "are incomplete"));
     }
     EXPECT_EQ(readFile(dataFile("Lease.dat")), "1\nL1\n");

@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <filesystem>
 #include <functional>
 #include <map>
@@ -11,37 +12,112 @@
 #include "support/AgentEnvironment.h"
 #include "support/Files.h"
 
-// The states that a file system may have after a power failure: any subset of the changes of names that were not
-// synced, and the first part of the writes that were not synced, or all of them with one write as zeros.
+// The states that a file system may have after a power failure. Of the changes that were not synced, any subset may be
+// there: of the names, and of the writes to each file. A write may also be there in part, and the file may have the
+// size that it has with the writes that are missing. A truncation takes effect before the writes that follow it.
 
 namespace gatetest {
+
+/** A set of writes, with the number of bytes of each that are on the disk. */
+using WrittenSizes = std::vector<std::size_t>;
+
+/** The writes to a file between two truncations. */
+struct Writes {
+    std::vector<Event> events{};
+
+    /** Adds all contents to which they may lead from a content. */
+    void addContents(const std::string& start, std::set<std::string>& contents) const {
+        for (const WrittenSizes& sizes : possible()) {
+            std::string content = start;
+            std::size_t end = start.size();
+            for (std::size_t index = 0; index < events.size(); ++index) {
+                const Event& event = events[index];
+                end = std::max(end, event.offset + event.data.size());
+                if (sizes[index] != 0) {
+                    content.resize(std::max(content.size(), event.offset + sizes[index]));
+                    content.replace(event.offset, sizes[index], event.data, 0, sizes[index]);
+                }
+            }
+            contents.insert(content);
+            content.resize(end);  // with zeros
+            contents.insert(content);
+        }
+    }
+
+private:
+    static constexpr std::size_t most = 10;  ///< the number of writes of which all subsets are tried
+
+    /** All subsets. Of many writes, only: the first ones, all without one, and each alone. Each is also there in part.
+     */
+    std::vector<WrittenSizes> possible() const {
+        std::vector<WrittenSizes> all;
+        const auto add = [&](auto sizeOf) {
+            WrittenSizes sizes;
+            for (std::size_t index = 0; index < events.size(); ++index) {
+                sizes.push_back(sizeOf(index, events[index].data.size()));
+            }
+            all.push_back(sizes);
+        };
+        const std::size_t subsets = events.size() <= most ? std::size_t{1} << events.size() : 0;
+        for (std::size_t chosen = 0; chosen < subsets; ++chosen) {
+            add([&](std::size_t index, std::size_t size) { return (chosen >> index & 1U) != 0 ? size : 0; });
+        }
+        for (std::size_t one = 0; one <= events.size(); ++one) {
+            for (const std::size_t divisor : {std::size_t{1}, std::size_t{2}, ~std::size_t{0}}) {
+                const auto partOf = [&](std::size_t size) { return size / divisor; };
+                add([&](std::size_t each, std::size_t size) {
+                    return each == one ? partOf(size) : each < one ? size : 0;
+                });
+                add([&](std::size_t each, std::size_t size) { return each == one ? partOf(size) : size; });
+                add([&](std::size_t each, std::size_t size) { return each == one ? partOf(size) : 0; });
+            }
+        }
+        return all;
+    }
+};
 
 /** A file's data: the synced content, and the operations since. */
 struct Data {
     std::string synced{};
     std::vector<Event> pending{};
 
-    /** With the first operations since. @param hole an operation whose data are zeros; none if it is `count` */
-    std::string with(std::size_t count, std::size_t hole) const {
+    /** With all operations since. */
+    std::string current() const {
         std::string content = synced;
-        for (std::size_t index = 0; index < count; ++index) {
-            const Event& event = pending[index];
-            if (event.kind == Kind::truncate) {
-                content.resize(event.size);
-            } else {
-                content += index == hole ? std::string(event.data.size(), '\0') : event.data;
-            }
+        for (const Event& event : pending) {
+            content.resize(event.kind == Kind::truncate ? event.offset : std::max(content.size(), event.offset));
+            content.replace(event.offset, event.data.size(), event.data);
         }
         return content;
     }
 
     /** All contents that the file may have after a power failure. */
     std::set<std::string> possible() const {
-        std::set<std::string> contents;
-        for (std::size_t count = 0; count <= pending.size(); ++count) {
-            contents.insert(with(count, count));
-            contents.insert(with(pending.size(), count));
+        std::set<std::string> contents{synced};
+        std::set<std::string> starts{synced};
+        Writes writes;
+        const auto addContents = [&] {
+            std::set<std::string> reached;
+            for (const std::string& start : starts) {
+                writes.addContents(start, reached);
+            }
+            contents.insert(reached.begin(), reached.end());
+            return reached;
+        };
+        for (const Event& event : pending) {
+            if (event.kind != Kind::truncate) {
+                writes.events.push_back(event);
+                continue;
+            }
+            const std::set<std::string> reached = addContents();
+            starts.clear();
+            for (std::string content : reached) {
+                content.resize(event.offset);
+                starts.insert(std::move(content));
+            }
+            writes.events.clear();
         }
+        addContents();
         return contents;
     }
 };
@@ -73,7 +149,7 @@ public:
                 pendingNames.clear();
                 break;
             case Kind::sync:
-                data[event.file] = {data[event.file].with(data[event.file].pending.size(), ~std::size_t{0}), {}};
+                data[event.file] = {data[event.file].current(), {}};
                 break;
             case Kind::truncate:
             case Kind::write:

@@ -55,6 +55,16 @@ struct OpenResults {
     }
 };
 
+/** Lets record files appear unreadable for lack of descriptors during its lifetime, except for the gate. */
+struct UnreadableRecords {
+    static inline int count = 0;
+
+    UnreadableRecords() { ++count; }
+    ~UnreadableRecords() { --count; }
+    UnreadableRecords(const UnreadableRecords&) = delete;
+    UnreadableRecords& operator=(const UnreadableRecords&) = delete;
+};
+
 /** Returns the outcomes of a creation, a modification and a deletion of leases. */
 std::vector<Outcome> changes(testsupport::ProviderLibrary& gate) {
     const auto with = [](const std::string& id) {
@@ -126,6 +136,30 @@ TEST_F(StorageTest, AFileThatCannotBeOpenedIsNamedAndNothingChanges) {
     }
     EXPECT_THAT(identifiers(), ElementsAre("L1"));
     EXPECT_EQ(valueIn(instanceOf("L1"), "LeaseTerm"), "1");
+}
+
+TEST_F(StorageTest, RecordsThatTheProviderCouldNotReadAreNotReportedAsMissing) {
+    create(firstNode, {named("Lessor", text("ACME"))});
+    create(firstNode, {}, warranty);
+    unload();
+    {
+        const UnreadableRecords unreadable;
+        for (const char* name : {lease, warranty}) {
+            const auto isUnread = isRefused(CMPI_RC_ERR_FAILED, std::string("could not read the records of ") + name);
+            const std::string setting = name == lease ? leaseSetting : warrantySetting;
+            EXPECT_THAT(gate().enumerateInstances(classPath(name)), isUnread);
+            EXPECT_THAT(gate().enumerateInstanceNames(classPath(name)), isUnread);
+            EXPECT_THAT(gate().getInstance(keyedPath(name, firstNode)), isUnread);
+            EXPECT_THAT(gate().associators(computerPath("alpha"), {setting, {}, {}, {}}), isUnread);
+            EXPECT_THAT(gate().associatorNames(computerPath("alpha"), {setting, {}, {}, {}}), isUnread);
+            EXPECT_THAT(remove(firstNode, name), isUnread);
+            EXPECT_THAT(create("L2", {}, name), isUnread);
+        }
+        EXPECT_THAT(gate().enumerateInstances(classPath(agent)), isAnswered(1)) << "without a file";
+        EXPECT_THAT(remove(firstNode), isRefused(CMPI_RC_ERR_FAILED, "repeat the request"));
+    }
+    EXPECT_EQ(valueIn(instanceOf(firstNode), "Lessor"), "ACME");
+    EXPECT_THAT(identifiers(warranty), ElementsAre(firstNode));
 }
 
 TEST_F(StorageTest, OnlyRegularFilesAreWritten) {
@@ -341,7 +375,10 @@ namespace {
 /** Opens a file, or fails with EMFILE. */
 FILE* openIfAllowed(const char* function, const char* path, const char* mode) {
     using Function = FILE* (*)(const char*, const char*);
-    if (*mode == 'w' && !gatetest::OpenResults::take()) {
+    const std::filesystem::path name = std::filesystem::path(path).filename();
+    const bool isRecordFile = name == "Lease.dat" || name == "Warranty.dat";
+    if (*mode == 'r' ? isRecordFile && gatetest::UnreadableRecords::count > 0
+                     : *mode == 'w' && !gatetest::OpenResults::take()) {
         errno = EMFILE;
         return nullptr;
     }

@@ -8,6 +8,7 @@
 #include <thread>
 
 #include "GateFixture.h"
+#include "SimulatedTime.h"
 #include "durable/DirectoryLock.h"
 #include "support/Files.h"
 
@@ -85,6 +86,7 @@ TEST_F(TwoProcessesTest, AReaderIsRefusedUntilTheOwnerHasWrittenTheFile) {
     const std::string complete = testsupport::readFile(dataFile("Lease.dat"));
     testsupport::writeFile(dataFile("Lease.dat"), complete.substr(0, complete.size() / 2));
     for (int time = 0; time < 2; ++time) {
+        const SimulatedTime waiting;
         EXPECT_THAT(gate().enumerateInstanceNames(classPath(lease)),
                     isRefused(CMPI_RC_ERR_FAILED, "another process is writing them"));
     }
@@ -113,6 +115,8 @@ TEST_F(TwoProcessesTest, AReaderReturnsWhatItHasReadWhileTheOwnerWritesWithoutPa
     EXPECT_THAT(identifiers(), ElementsAre("L1"));
     isWriting = false;
     writer.join();
+    std::filesystem::last_write_time(dataFile("Lease.dat"),
+                                     std::filesystem::file_time_type::clock::now() - std::chrono::minutes(1));
     EXPECT_THAT(identifiers(), ElementsAre("L1", "L2"));
 }
 
@@ -121,7 +125,10 @@ TEST_F(TwoProcessesTest, AForkedChildOfTheOwnerReadsWhatTheOwnerStores) {
     OtherProcess child({[&] {
                             return identifiers() == std::vector<std::string>{"L1", "L2"};
                         },
-                        [&] { return create("L3").message.find("is in use by process") != std::string::npos; }});
+                        [&] {
+                            const SimulatedTime waiting;
+                            return create("L3").message.find("is in use by process") != std::string::npos;
+                        }});
     create("L2");
     EXPECT_TRUE(child.does(0));
     EXPECT_TRUE(child.does(1));
@@ -131,7 +138,10 @@ TEST_F(TwoProcessesTest, AForkedChildOfTheOwnerReadsWhatTheOwnerStores) {
 TEST_F(TwoProcessesTest, AChangeIsRefusedWithTheNameOfTheOwnerUntilItEnds) {
     OtherProcess owner({[&] { return create("L1").rc == CMPI_RC_OK; }, [&] { return create("L2").rc == CMPI_RC_OK; }});
     ASSERT_TRUE(owner.does(0));
-    const Outcome refused = create("L3");
+    const Outcome refused = [&] {
+        const SimulatedTime waiting;
+        return create("L3");
+    }();
     EXPECT_THAT(refused, isRefused(CMPI_RC_ERR_FAILED, "process " + std::to_string(owner.id()) + " (gate_test)"));
     EXPECT_THAT(refused.message, HasSubstr(agentEnvironment::dataDirectory().string()));
     ASSERT_TRUE(owner.does(1));
@@ -147,7 +157,10 @@ TEST_F(TwoProcessesTest, AnOwnerThatLosesTheLockReadsTheFilesAgain) {
     create("L1");
     std::filesystem::remove(dataFile("owner"));
     ASSERT_TRUE(other.does(0));
-    EXPECT_THAT(create("L3"), isRefused(CMPI_RC_ERR_FAILED, "is in use by process"));
+    {
+        const SimulatedTime waiting;
+        EXPECT_THAT(create("L3"), isRefused(CMPI_RC_ERR_FAILED, "is in use by process"));
+    }
     EXPECT_THAT(identifiers(), ElementsAre("L1", "L2"));
     other.end();
     EXPECT_THAT(create("L3"), isAnswered(1));
