@@ -177,7 +177,7 @@ std::string RecordFile::recover() const {
     const std::string state = defect();
     if (state.empty()) {
         if (const SavedCopies::Copy copy = savedCopy(); !copy.content.empty()) {
-            syncFile(copy.path);  // it may be of a process that has ended before
+            syncFile(copy.path);  // the process that wrote it may have ended before its sync
         }
         copies.finishRestoring();
         return {};

@@ -71,7 +71,7 @@ std::array<SavedCopies::Copy, 2> SavedCopies::byAge() const {
 
 void SavedCopies::save(std::string_view content, bool isInUse) const {
     const auto [older, last] = byAge();
-    if (older.content.empty()) {  // then its name may not be on the disk
+    if (older.content.empty()) {  // its name may not be on the disk yet
         createFile(older.path, 0600);
         syncDirectoryOf(older.path);
     }

@@ -150,7 +150,7 @@ CMPIString* getType(const CMPIBroker* broker, const void* object, CMPIStatus* rc
         rc, nullptr, [&] { return arenaOf(broker).make<CMPIString>(typeNameOf(anyObject(broker, object).kind())); });
 }
 
-/** @param characters the message; null: it is in the string */
+/** Logs a record. @param characters the message; null: the string has it */
 CMPIStatus record(const CMPIBroker* broker, LogRecord record, const char* component, const char* characters,
                   const CMPIString* string) {
     return guarded([&] {

@@ -9,8 +9,8 @@
 namespace cimhost::cimxml {
 
 /**
- * Reads CIM objects from elements of a request. Values take the types that the schema declares, and names its letter
- * case; of classes and properties that it does not know, those of the element.
+ * Reads CIM objects from elements of a request. The schema determines the types of values and the letter case of names;
+ * for classes and properties that it does not have, the element does.
  * All functions throw CimError with CMPI_RC_ERR_INVALID_PARAMETER for an element that is not of the expected kind, a
  * value that does not fit its type, and a key that the class does not have.
  */

@@ -49,7 +49,7 @@ struct OpenEnumeration {
 
 struct EnumerationLimits {
     std::size_t open = 100;            ///< enumerations open at the same time
-    std::chrono::seconds timeout{60};  ///< for clients that ask for none
+    std::chrono::seconds timeout{60};  ///< if the client asks for no timeout
     std::chrono::seconds longestTimeout{600};
     std::uint32_t mostObjects = 10'000;  ///< of one pull
 };
