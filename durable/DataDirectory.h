@@ -57,7 +57,7 @@ public:
     bool hasChanged() const { return !isOwner() && stamp() != openStamp; }
 
     /** Whether the provider has to be loaded again, because another process has changed the files or may have. */
-    bool isOutdated() const { return hasOtherOwner || (hasChanged() && !needRecovery()); }
+    bool isOutdated() const { return hasOtherOwner || hasChanged(); }
 
 private:
     /** The inodes, sizes and times of the record files. */

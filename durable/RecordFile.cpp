@@ -186,13 +186,13 @@ std::string RecordFile::recover() const {
     if (!restored.empty()) {
         return state + " " + restored;
     }
-    const std::string current = content().value_or(std::string());
-    if (current.empty() || isComplete(current)) {
+    const std::optional<std::string> current = content();
+    if (!current || isComplete(*current)) {
         return {};
     }
-    const bool isKept = access(file.substr(0, file.rfind('/') + 1).c_str(), W_OK) == 0;
+    const bool isKept = !current->empty() && access(file.substr(0, file.rfind('/') + 1).c_str(), W_OK) == 0;
     if (isKept) {
-        replaceFile(damaged, current, file);
+        replaceFile(damaged, *current, file);
     }
     return state + " There is no saved copy." + (isKept ? " A copy of it is kept as " + damaged + "." : "");
 }

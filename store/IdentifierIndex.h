@@ -11,7 +11,8 @@ namespace KO::LeaseWarrantyProvider {
 
 /**
  * Finds the records of a table by identifier in constant time: a hash table whose chains are in table order. Needs
- * three words per record. Contains deleted records, too; an identifier may occur more than once.
+ * three words per record. An identifier may occur more than once. Deleted records leave their chain when another
+ * record is appended to it.
  */
 template <class Unit>
 class IdentifierIndex {
@@ -57,7 +58,12 @@ void IdentifierIndex<Unit>::append(const std::vector<Unit>& table) {
     links.push_back(none);
     std::size_t* end = &heads[chainOf(table[position].InstanceID)];
     while (*end != none) {
-        end = &links[*end];
+        std::size_t& next = links[*end];
+        if (table[*end].inUse) {
+            end = &next;
+        } else {
+            *end = next;
+        }
     }
     *end = position;
 }
@@ -70,6 +76,9 @@ void IdentifierIndex<Unit>::rebuild(const std::vector<Unit>& table) {
     links.reserve(heads.size());
     links.resize(table.size());
     for (std::size_t position = table.size(); position-- > 0;) {
+        if (!table[position].inUse) {
+            continue;
+        }
         std::size_t& head = heads[chainOf(table[position].InstanceID)];
         links[position] = head;
         head = position;
@@ -89,8 +98,9 @@ std::size_t IdentifierIndex<Unit>::find(const std::vector<Unit>& table, const st
         }
         return position < table.size() ? position : none;
     }
-    // A walk over records with one identifier continues in their chain instead of at its head.
-    const bool continues = from > 0 && from <= table.size() && table[from - 1].InstanceID == identifier;
+    // A walk over records with one identifier continues in their chain instead of at its head, unless the last one has
+    // been deleted meanwhile.
+    const bool continues = from > 0 && from <= table.size() && matches(from - 1);
     position = heads.empty() ? none : continues ? links[from - 1] : heads[chainOf(identifier)];
     while (position != none && (position < from || !matches(position))) {
         position = links[position];

@@ -1,6 +1,7 @@
 """Exit status of the tools: 0 for success, 1 with the reason if the tool failed, 2 for wrong usage."""
 
 import argparse
+import os
 import sys
 
 from . import terms
@@ -29,4 +30,5 @@ def run(main, name):
         main()
     except (Unreadable, OSError, UnicodeError) as error:
         print(f"{name}: {error}", file=sys.stderr)
+        os.dup2(os.open(os.devnull, os.O_WRONLY), 1)  # otherwise Python writes again, and ends with 120 if that fails
         sys.exit(1)

@@ -225,9 +225,9 @@ TEST_F(RecordFileTest, TheOlderCopyIsOverwrittenAndTheNewerOneIsUsed) {
     }
 }
 
-TEST_F(RecordFileTest, AnEmptyFileWithoutSavedCopyHasNoRecords) {
+TEST_F(RecordFileTest, AnEmptyFileWithoutSavedCopyIsReportedAndHasNoRecords) {
     writeFile(path, "");
-    EXPECT_THAT(file.recover(), IsEmpty());
+    EXPECT_EQ(file.recover(), "Warranty.dat had no count of records. There is no saved copy.");
     EXPECT_FALSE(fs::exists(damaged));
     EXPECT_EQ(prepare(), "0\n");
 }

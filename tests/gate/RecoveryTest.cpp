@@ -1,3 +1,5 @@
+#include <linux/capability.h>
+#include <sys/syscall.h>
 #include <unistd.h>
 
 #include <cstdlib>
@@ -37,6 +39,9 @@ public:
         fs::permissions(directory.parent_path(), fs::perms(0755));
         fs::permissions(directory, fs::perms(0555));
         wasRoot = geteuid() == 0 && setresuid(unprivileged, unprivileged, 0) == 0;
+        if (wasRoot && access(testsupport::underTest(GATE_LIBRARY).c_str(), R_OK) != 0) {
+            permitReading();
+        }
     }
     ~UnwritableDirectory() {
         if (wasRoot && setresuid(0, 0, 0) != 0) {
@@ -49,6 +54,16 @@ public:
 
 private:
     static constexpr uid_t unprivileged = 65534;
+
+    /** Lets this thread read all files, as the libraries may be in a directory of root, but write none of them. */
+    static void permitReading() {
+        __user_cap_header_struct header{_LINUX_CAPABILITY_VERSION_3, 0};
+        __user_cap_data_struct sets[_LINUX_CAPABILITY_U32S_3]{};
+        if (syscall(SYS_capget, &header, sets) == 0) {
+            sets[0].effective = sets[0].permitted & (1U << CAP_DAC_READ_SEARCH);
+            EXPECT_EQ(syscall(SYS_capset, &header, sets), 0);
+        }
+    }
 
     fs::path directory;
     fs::perms before;

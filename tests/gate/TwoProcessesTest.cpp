@@ -120,6 +120,18 @@ TEST_F(TwoProcessesTest, AReaderReturnsWhatItHasReadWhileTheOwnerWritesWithoutPa
     EXPECT_THAT(identifiers(), ElementsAre("L1", "L2"));
 }
 
+TEST_F(TwoProcessesTest, AReaderRestoresWhatAnOwnerHasStoredThatEndedDuringAnotherChange) {
+    OtherProcess owner({[&] { return create("L1").rc == CMPI_RC_OK; }, [&] { return create("L2").rc == CMPI_RC_OK; }});
+    ASSERT_TRUE(owner.does(0));
+    EXPECT_THAT(identifiers(), ElementsAre("L1"));
+    ASSERT_TRUE(owner.does(1));
+    const std::string complete = testsupport::readFile(dataFile("Lease.dat"));
+    testsupport::writeFile(dataFile("Lease.dat"), complete.substr(0, complete.size() / 2));
+    owner.end();
+    EXPECT_THAT(identifiers(), ElementsAre("L1", "L2"));
+    EXPECT_EQ(testsupport::readFile(dataFile("Lease.dat")), complete);
+}
+
 TEST_F(TwoProcessesTest, AForkedChildOfTheOwnerReadsWhatTheOwnerStores) {
     create("L1");
     OtherProcess child({[&] {

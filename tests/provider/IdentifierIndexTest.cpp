@@ -64,6 +64,34 @@ TEST_F(IdentifierIndexTest, OmitsDeletedRecords) {
     EXPECT_EQ(positions("A"), (Positions{2}));
 }
 
+/** A record that counts how often an index reads whether it is in use. */
+struct CountingRecord {
+    struct Flag {
+        bool value;
+        operator bool() const {
+            ++reads;
+            return value;
+        }
+        static inline int reads = 0;
+    };
+    Flag inUse{true};
+    std::string InstanceID{"A"};
+};
+
+TEST(IdentifierIndexOfOneIdentifierTest, TakesConstantTimeAfterManyDeletions) {
+    std::vector<CountingRecord> table;
+    IdentifierIndex<CountingRecord> index;
+    for (int round = 0; round < 1000; ++round) {
+        table.emplace_back();
+        index.update(table);
+        CountingRecord::Flag::reads = 0;
+        EXPECT_EQ(index.find(table, "A", 0), table.size() - 1);
+        EXPECT_LE(CountingRecord::Flag::reads, 2);
+        table.back().inUse.value = false;
+    }
+    EXPECT_EQ(index.find(table, "A", 0), index.none);
+}
+
 TEST_F(IdentifierIndexTest, FindsAppendedRecords) {
     for (int record = 0; record < 1000; ++record) {
         append({std::to_string(record % 500).c_str()});
