@@ -236,6 +236,20 @@ TEST_F(InstanceOperationsTest, ModificationPassesPropertiesAndList) {
     EXPECT_THAT(*sent.properties, ElementsAre("Size"));
 }
 
+TEST_F(InstanceOperationsTest, AModifiedInstanceIsOfTheClassOfItsName) {
+    const auto modify = [&](const std::string& className) {
+        return statusOf(response("ModifyInstance",
+                                 parameter("ModifiedInstance", "<VALUE.NAMEDINSTANCE>" + instanceName("Derived", "a") +
+                                                                   "<INSTANCE CLASSNAME=\"" + className +
+                                                                   "\"></INSTANCE></VALUE.NAMEDINSTANCE>")));
+    };
+    for (const char* other : {"Base", "Other", "Nothing"}) {
+        EXPECT_EQ(modify(other), CMPI_RC_ERR_INVALID_PARAMETER) << other;
+    }
+    EXPECT_THAT(manager.requests, IsEmpty());
+    EXPECT_EQ(modify("DERIVED"), 0);
+}
+
 TEST_F(InstanceOperationsTest, PathsMustNameTheKeysOfTheClass) {
     const auto get = [&](const std::string& name) {
         return statusOf(response("GetInstance", parameter("InstanceName", name)));
