@@ -71,7 +71,7 @@ bool isWanted(const std::string& name, const InstanceParts& parts) {
            (!parts.properties || isInList(*parts.properties, name));
 }
 
-/** The element of a property that is not a reference, and its type in CIM-XML. */
+/** The element of a property. */
 const char* elementOf(const Value& value) {
     return value.type == CMPI_ref ? "PROPERTY.REFERENCE" : value.isArray ? "PROPERTY.ARRAY" : "PROPERTY";
 }
