@@ -9,7 +9,7 @@
 namespace cimhost::cimxml {
 namespace {
 
-void appendFlag(std::string& xml, const char* name, bool value) {
+void appendFlag(std::string& xml, std::string_view name, bool value) {
     appendAttribute(xml, name, value ? "true" : "false");
 }
 
@@ -157,6 +157,15 @@ void appendQualifierDeclaration(std::string& xml, const QualifierDeclaration& de
         appendFlag(xml, "ISARRAY", declaration.isArray);
         appendFlavor(xml, declaration.flavor);
     });
+    {
+        const Element scope(xml, "SCOPE", [&] {
+            for (std::size_t i = 0; i < scopeNames.size(); ++i) {
+                if (declaration.scope[i]) {
+                    appendFlag(xml, scopeNames[i], true);
+                }
+            }
+        });
+    }
     writer.appendValue(xml, declaration.defaultValue);
 }
 

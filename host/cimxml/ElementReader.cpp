@@ -233,7 +233,11 @@ Instance ElementReader::instance(const XmlElement& element) const {
 
 Instance ElementReader::namedInstance(const XmlElement& element) const {
     Instance named = instance(childOf(element, "INSTANCE"));
-    named.path = path(childOf(element, "INSTANCENAME"));
+    ObjectPath name = path(childOf(element, "INSTANCENAME"));
+    if (!cim::sameName(named.path.className, name.className)) {
+        invalid("The instance is of class " + named.path.className + ", but its name of class " + name.className + ".");
+    }
+    named.path = std::move(name);
     return named;
 }
 

@@ -36,7 +36,19 @@ struct CharacterWriter {
         }
         std::array<char, 64> digits{};
         const auto written = std::to_chars(digits.data(), digits.data() + digits.size(), number);
-        xml.append(digits.data(), written.ptr);
+        const std::string_view all(digits.data(), static_cast<std::size_t>(written.ptr - digits.data()));
+        if constexpr (std::is_floating_point_v<Number>) {
+            xml += withDecimalPoint(all);
+        } else {
+            xml += all;
+        }
+    }
+
+    /** A real number has a decimal point in CIM-XML, also if its mantissa is an integer. */
+    static std::string withDecimalPoint(std::string_view digits) {
+        const std::string_view mantissa = digits.substr(0, digits.find('e'));
+        const bool needsPoint = mantissa.find('.') == std::string_view::npos;
+        return std::string(mantissa) + (needsPoint ? ".0" : "") + std::string(digits.substr(mantissa.size()));
     }
 
     static std::string utf8Of(Char16 character) {

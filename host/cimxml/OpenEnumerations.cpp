@@ -33,7 +33,7 @@ std::optional<std::string> OpenEnumerations::keep(OpenEnumeration enumeration, s
     const std::lock_guard<std::mutex> lock(mutex);
     erase(now);
     if (identifier.empty()) {
-        if (kept.size() >= limits.open) {
+        if (!hasRoomFor(enumeration)) {
             return std::nullopt;
         }
         identifier = randomIdentifier();
@@ -72,6 +72,18 @@ void OpenEnumerations::erase(Clock::time_point now) {
     for (auto each = kept.begin(); each != kept.end();) {
         each = each->second.expires <= now ? kept.erase(each) : std::next(each);
     }
+}
+
+/** Whether a new enumeration may be kept, with the mutex locked. */
+bool OpenEnumerations::hasRoomFor(const OpenEnumeration& added) const {
+    std::size_t results = added.cursor.left();
+    std::size_t ofSameUser = 0;
+    for (const auto& [identifier, each] : kept) {
+        results += each.enumeration.cursor.left();
+        ofSameUser += each.enumeration.principal == added.principal ? 1 : 0;
+    }
+    const std::size_t mostOfOneUser = added.principal.empty() ? limits.open : (limits.open + 1) / 2;
+    return kept.size() < limits.open && ofSameUser < mostOfOneUser && results <= limits.results;
 }
 
 }  // namespace cimhost::cimxml

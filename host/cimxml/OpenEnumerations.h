@@ -48,7 +48,8 @@ struct OpenEnumeration {
 };
 
 struct EnumerationLimits {
-    std::size_t open = 100;            ///< enumerations open at the same time
+    std::size_t open = 100;            ///< enumerations open at the same time; for one user half of them
+    std::size_t results = 200'000;     ///< that all open enumerations have together
     std::chrono::seconds timeout{60};  ///< if the client asks for no timeout
     std::chrono::seconds longestTimeout{600};
     std::uint32_t mostObjects = 10'000;  ///< of one pull
@@ -64,7 +65,7 @@ public:
     /**
      * Keeps an enumeration until it is taken or its timeout has passed.
      * @param identifier the one that it had before; empty for a new enumeration
-     * @return its identifier; none if too many enumerations are open
+     * @return its identifier; none if too many enumerations are open, or they have too many results
      */
     std::optional<std::string> keep(OpenEnumeration enumeration, std::string identifier, Clock::time_point now);
 
@@ -84,6 +85,7 @@ private:
     };
 
     void erase(Clock::time_point now);
+    bool hasRoomFor(const OpenEnumeration& added) const;
 
     EnumerationLimits limits;
     mutable std::mutex mutex;

@@ -73,7 +73,8 @@ OperationResult Operations::part(const Call& call, OpenEnumeration enumeration, 
         context = enumerations.keep(std::move(enumeration), identifier, OpenEnumerations::Clock::now());
     }
     if (!context) {
-        throw CimError(serverLimitsExceeded, "Too many enumerations are open; try again later.");
+        throw CimError(serverLimitsExceeded,
+                       "Too many enumerations are open, or they have too many results; try again later.");
     }
     appendParameter(result.parameters, "EnumerationContext", "string", *context);
     appendParameter(result.parameters, "EndOfSequence", "boolean", isAtEnd ? "TRUE" : "FALSE");

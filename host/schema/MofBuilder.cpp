@@ -47,6 +47,17 @@ CMPIType readType(const Node& node) {
     return *type;
 }
 
+Scope readScope(const Node& clause) {
+    Scope scope;
+    for (const Node* element : children<mof::MetaElement>(clause)) {
+        for (std::size_t i = 0; i < scope.size(); ++i) {
+            const bool isNamed = cim::sameName(element->string_view(), scopeNames[i]);
+            scope[i] = scope[i] || isNamed || cim::sameName(element->string_view(), "any");
+        }
+    }
+    return scope;
+}
+
 void applyFlavor(Flavor& flavor, const Node& node) {
     struct Row {
         const char* name;
@@ -144,6 +155,7 @@ void MofBuilder::buildQualifierDeclaration(const Node& node) {
         const Property type{declaration.name, declaration.type, declaration.isArray};
         declaration.defaultValue = readValue(*initializerOf(*value), type);
     }
+    declaration.scope = readScope(*findChild<mof::ScopeClause>(node));
     if (const Node* clause = findChild<mof::FlavorClause>(node)) {
         for (const Node* flavor : children<mof::FlavorName>(*clause)) {
             applyFlavor(declaration.flavor, *flavor);

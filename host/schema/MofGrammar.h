@@ -120,7 +120,7 @@ using Selected = peg::parse_tree::selector<
                                        QualifierName, Qualifier, QualifierList, DataType, FeatureName, ArraySize,
                                        ReferenceMark, ArrayMark, Parameter, ParameterName, ParameterList, Feature,
                                        ClassName, SuperclassName, ClassDeclaration, AssignedName, Assignment,
-                                       InstanceDeclaration, QualifierDeclaration, FlavorClause, PragmaName, Pragma,
-                                       QualifiedDeclaration, AliasClause>>;
+                                       InstanceDeclaration, QualifierDeclaration, ScopeClause, MetaElement,
+                                       FlavorClause, PragmaName, Pragma, QualifiedDeclaration, AliasClause>>;
 
 }  // namespace cimhost::grammar::mof

@@ -1,5 +1,7 @@
 #pragma once
 
+#include <array>
+#include <bitset>
 #include <map>
 #include <memory>
 #include <string>
@@ -26,6 +28,13 @@ struct Qualifier {
     bool isPropagated = false;  ///< inherited from a superclass, not declared
 };
 
+/** Kinds of elements that a qualifier may qualify, as CIM-XML names them. */
+constexpr std::array<std::string_view, 7> scopeNames{"CLASS",  "ASSOCIATION", "REFERENCE", "PROPERTY",
+                                                     "METHOD", "PARAMETER",   "INDICATION"};
+
+/** A set of these kinds, by their position in scopeNames. */
+using Scope = std::bitset<scopeNames.size()>;
+
 /** Declaration of a qualifier: type and default value. */
 struct QualifierDeclaration {
     std::string name{};
@@ -33,6 +42,7 @@ struct QualifierDeclaration {
     bool isArray = false;
     Value defaultValue{};
     Flavor flavor{};
+    Scope scope{};
     bool standard = false;  ///< declared by the CIM standard; a MOF file may declare it again
 };
 

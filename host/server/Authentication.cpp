@@ -6,12 +6,12 @@
 #include <unistd.h>
 
 #include <algorithm>
-#include <array>
 #include <cstdlib>
 #include <cstring>
 #include <vector>
 
 #include "cim/Names.h"
+#include "server/UserDatabase.h"
 
 namespace cimhost::server {
 namespace {
@@ -103,10 +103,13 @@ private:
 
 /** Names of all groups of a user; empty for an unknown user. */
 std::vector<std::string> groupsOf(const std::string& user) {
-    std::array<char, 16384> buffer{};
+    std::vector<char> buffer;
     passwd entry{};
     passwd* found = nullptr;
-    if (::getpwnam_r(user.c_str(), &entry, buffer.data(), buffer.size(), &found) != 0 || found == nullptr) {
+    const auto readUser = [&](char* data, std::size_t size) {
+        return ::getpwnam_r(user.c_str(), &entry, data, size, &found);
+    };
+    if (!readEntry(buffer, readUser) || found == nullptr) {
         return {};
     }
     int count = 1024;
@@ -116,9 +119,10 @@ std::vector<std::string> groupsOf(const std::string& user) {
     for (int i = 0; i < count; ++i) {
         group groupEntry{};
         group* foundGroup = nullptr;
-        if (::getgrgid_r(ids[static_cast<std::size_t>(i)], &groupEntry, buffer.data(), buffer.size(), &foundGroup) ==
-                0 &&
-            foundGroup != nullptr) {
+        const auto readGroup = [&](char* data, std::size_t size) {
+            return ::getgrgid_r(ids[static_cast<std::size_t>(i)], &groupEntry, data, size, &foundGroup);
+        };
+        if (readEntry(buffer, readGroup) && foundGroup != nullptr) {
             names.emplace_back(groupEntry.gr_name);
         }
     }

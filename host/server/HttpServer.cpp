@@ -147,6 +147,9 @@ struct HttpServer::Endpoint {
     static void notifyCompleted(void* self, MHD_Connection*, void** context, MHD_RequestTerminationCode) {
         const std::unique_ptr<Exchange> exchange(static_cast<Exchange*>(*context));
         *context = nullptr;
+        if (exchange == nullptr) {  // there was no memory for it
+            return;
+        }
         const RequestHandler& handler = static_cast<Endpoint*>(self)->server.handler;
         Connection& connection = *exchange->connection;
         if (!exchange->isLogged) {

@@ -34,6 +34,7 @@ void readLimits(TableReader table, Limits& limits) {
     readNumber(table, "xml_depth", limits.xmlDepth, 200);
     readNumber(table, "xml_elements", limits.xmlElements, 10'000'000);
     readNumber(table, "open_enumerations", limits.enumerations.open, 1'000'000);
+    readNumber(table, "enumeration_results", limits.enumerations.results, 1'000'000'000);
     readSeconds(table, "queue_seconds", limits.queueTime);
     readSeconds(table, "head_seconds", limits.headTime);
     readSeconds(table, "body_seconds", limits.bodyTime);

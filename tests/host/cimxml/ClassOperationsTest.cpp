@@ -5,6 +5,7 @@ namespace {
 
 using testing::ElementsAre;
 using testing::IsEmpty;
+using testing::UnorderedElementsAre;
 
 class ClassOperationsTest : public CimXmlTest {
 protected:
@@ -90,6 +91,29 @@ TEST_F(ClassOperationsTest, QualifierDeclarationsHaveTypeAndFlavor) {
     EXPECT_EQ(*key.attribute("TYPE"), "boolean");
     EXPECT_EQ(*key.attribute("OVERRIDABLE"), "false");
     EXPECT_EQ(returned(response("EnumerateQualifiers", "")).size(), schema.qualifiers().size());
+}
+
+TEST_F(ClassOperationsTest, QualifierDeclarationsHaveTheirScope) {
+    MofReader(schema).readSource(
+        "Qualifier Mine : string, Scope(Reference, METHOD, schema); Qualifier All : string = \"x\", Scope(any);",
+        "test qualifiers");
+    const auto declared = [&](const std::string& name) {
+        return returned(response("GetQualifier", value("QualifierName", name))).at(0);
+    };
+    const auto scopeOf = [&](const std::string& name) {
+        std::vector<std::string> scope;
+        for (const auto& [attribute, isInScope] : declared(name).child("SCOPE")->attributes) {
+            EXPECT_EQ(isInScope, "true");
+            scope.push_back(attribute);
+        }
+        return scope;
+    };
+    EXPECT_THAT(scopeOf("Mine"), UnorderedElementsAre("REFERENCE", "METHOD"));
+    EXPECT_THAT(scopeOf("All"), UnorderedElementsAre("CLASS", "ASSOCIATION", "REFERENCE", "PROPERTY", "METHOD",
+                                                     "PARAMETER", "INDICATION"));
+    EXPECT_THAT(scopeOf("Key"), UnorderedElementsAre("PROPERTY", "REFERENCE"));
+    EXPECT_EQ(declared("All").children.at(0).name, "SCOPE");
+    EXPECT_EQ(declared("All").children.at(1).characters, "x");
 }
 
 TEST_F(ClassOperationsTest, AssociationsOfClassesComeFromTheSchema) {

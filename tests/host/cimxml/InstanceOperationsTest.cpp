@@ -153,6 +153,18 @@ TEST_F(InstanceOperationsTest, CharactersThatXmlLacksFailTheRequest) {
     EXPECT_THAT(*result.child("ERROR")->attribute("DESCRIPTION"), HasSubstr("Base.Text"));
 }
 
+TEST_F(InstanceOperationsTest, RealNumbersHaveADecimalPoint) {
+    constexpr std::pair<double, const char*> reals[] = {{36, "36.0"},      {-2, "-2.0"},         {0, "0.0"},
+                                                        {1e30, "1.0e+30"}, {1.5e-20, "1.5e-20"}, {0.25, "0.25"}};
+    for (const auto& [number, expected] : reals) {
+        manager.answer = [value = number](const Request&) {
+            return Response::ofInstances({instanceOf("Other", "a", {{"Ratio", Value::of(value)}})});
+        };
+        EXPECT_THAT(respond(request("EnumerateInstances", className("ClassName", "Other"))),
+                    HasSubstr(std::string("TYPE=\"real64\"><VALUE>") + expected + "</VALUE>"));
+    }
+}
+
 TEST_F(InstanceOperationsTest, CharactersOfPropertiesThatTheClientDoesNotWantAreNoError) {
     manager.answer = [](const Request& request) {
         return Response::ofInstances({instanceOf(request.path.className, "a", {{"Text", Value::of("b\x01")}})});
@@ -234,6 +246,20 @@ TEST_F(InstanceOperationsTest, ModificationPassesPropertiesAndList) {
     EXPECT_EQ(std::get<std::string>(sent.path.keys.at(0).value.single), "a");
     EXPECT_EQ(sent.instance.properties.size(), 1U);
     EXPECT_THAT(*sent.properties, ElementsAre("Size"));
+}
+
+TEST_F(InstanceOperationsTest, AModifiedInstanceIsOfTheClassOfItsName) {
+    const auto modify = [&](const std::string& className) {
+        return statusOf(response("ModifyInstance",
+                                 parameter("ModifiedInstance", "<VALUE.NAMEDINSTANCE>" + instanceName("Derived", "a") +
+                                                                   "<INSTANCE CLASSNAME=\"" + className +
+                                                                   "\"></INSTANCE></VALUE.NAMEDINSTANCE>")));
+    };
+    for (const char* other : {"Base", "Other", "Nothing"}) {
+        EXPECT_EQ(modify(other), CMPI_RC_ERR_INVALID_PARAMETER) << other;
+    }
+    EXPECT_THAT(manager.requests, IsEmpty());
+    EXPECT_EQ(modify("DERIVED"), 0);
 }
 
 TEST_F(InstanceOperationsTest, PathsMustNameTheKeysOfTheClass) {

@@ -104,6 +104,30 @@ TEST_F(PullOperationsTest, LimitsAndUnsupportedOptionsHaveTheirStatus) {
               CMPI_RC_ERR_INVALID_PARAMETER);
 }
 
+TEST_F(PullOperationsTest, OpenEnumerationsTogetherHaveALimitOfResults) {
+    options.limits.results = 9;
+    const std::string context = outputOf(open(value("MaxObjectCount", "1")), "EnumerationContext");  // 4 remain
+    EXPECT_EQ(statusOf(open("")), 0);
+    EXPECT_EQ(statusOf(open(value("MaxObjectCount", "4"))), 27);
+    EXPECT_EQ(statusOf(open(value("MaxObjectCount", "5"))), 0);  // none remain
+    EXPECT_EQ(returned(pull(context, 1)).size(), 1U);
+    EXPECT_EQ(statusOf(open(value("MaxObjectCount", "4"))), 0);
+    EXPECT_EQ(returned(pull(context, 1)).size(), 1U);  // also at the limit
+}
+
+TEST_F(PullOperationsTest, AUserOpensAtMostHalfOfTheEnumerations) {
+    options.limits.open = 4;
+    const auto openAs = [&](const std::string& user) {
+        return statusOf(respondedTo(request("OpenEnumerateInstances", className("ClassName", "Other")), {user, true}));
+    };
+    EXPECT_EQ(openAs("alice"), 0);
+    EXPECT_EQ(openAs("alice"), 0);
+    EXPECT_EQ(openAs("alice"), 27);
+    EXPECT_EQ(openAs("bob"), 0);
+    EXPECT_EQ(openAs("bob"), 0);
+    EXPECT_EQ(openAs("carol"), 27);
+}
+
 TEST(ResultCursorTest, AResultIsFreedWhenItIsWritten) {
     const ObjectWriter writer("host", "root/test");
     ResultCursor instances{Response::ofInstances({instanceOf("Other", "a"), instanceOf("Other", "b")})};

@@ -8,6 +8,7 @@
 #include <fstream>
 
 #include "server/Authentication.h"
+#include "server/UserDatabase.h"
 #include "support/Files.h"
 
 using namespace cimhost::server;
@@ -76,6 +77,22 @@ TEST(AccessRulesTest, AGroupGivesItsMembersTheRight) {
     EXPECT_EQ(rightOf(user->pw_name, rules), Right::read);
     EXPECT_EQ(rightOf("no-such-user", rules), Right::none);
     EXPECT_EQ(rightOf(std::string("@") + ownGroup->gr_name, {}), Right::none);
+}
+
+TEST(UserDatabaseTest, EntriesOfAnySizeAreRead) {
+    for (const std::size_t needed : {std::size_t{1}, std::size_t{1} << 20U}) {
+        std::vector<char> buffer;
+        EXPECT_TRUE(readEntry(buffer, [&](char* data, std::size_t size) {
+            if (size < needed) {
+                return ERANGE;
+            }
+            data[needed - 1] = 'x';
+            return 0;
+        })) << needed;
+    }
+    std::vector<char> buffer;
+    EXPECT_FALSE(readEntry(buffer, [](char*, std::size_t) { return ERANGE; }));
+    EXPECT_FALSE(readEntry(buffer, [](char*, std::size_t) { return EIO; }));
 }
 
 }  // namespace

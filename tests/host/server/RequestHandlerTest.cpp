@@ -81,6 +81,17 @@ TEST_F(RequestHandlerTest, TheDelayAfterAWrongPasswordIncludesTheTimeOfTheCheck)
     EXPECT_EQ(refused->status, 401U);
 }
 
+TEST_F(RequestHandlerTest, AWrongPasswordIsAnsweredAfterTheDelay) {
+    settings.limits.failureDelay = std::chrono::milliseconds(200);
+    Exchange exchange;
+    exchange.connection = &connection;
+    exchange.rules = {false, settings.limits.requestBytes};
+    const auto refused = handler().begin(exchange, head("EnumerateInstanceNames", wrong));
+    EXPECT_GE(std::chrono::steady_clock::now(), exchange.start + settings.limits.failureDelay);
+    ASSERT_TRUE(refused);
+    EXPECT_EQ(refused->status, 401U);
+}
+
 TEST_F(RequestHandlerTest, ThePasswordOfAnEndedConnectionIsNotChecked) {
     const test::TcpPair sockets;
     ConnectionTable table(settings.limits);

@@ -66,6 +66,7 @@ writers = []
 connections = 7
 head_seconds = 3
 open_enumerations = 5
+enumeration_results = 6
 enumeration_seconds = 20
 failure_milliseconds = 0
 )");
@@ -78,6 +79,7 @@ failure_milliseconds = 0
     EXPECT_EQ(settings.limits.connections, 7U);
     EXPECT_EQ(settings.limits.headTime.count(), 3);
     EXPECT_EQ(settings.limits.enumerations.open, 5U);
+    EXPECT_EQ(settings.limits.enumerations.results, 6U);
     EXPECT_EQ(settings.limits.enumerations.longestTimeout.count(), 20);
     EXPECT_EQ(settings.limits.failureDelay.count(), 0);
 }

@@ -1,0 +1,29 @@
+#pragma once
+
+#include <cerrno>
+#include <cstddef>
+#include <vector>
+
+namespace cimhost::server {
+
+/**
+ * Reads an entry of the user database with a function such as getgrgid_r(), and enlarges the buffer for an entry that
+ * does not fit: a group may have any number of members.
+ * @param read called with the buffer and its size, returns an error number
+ * @return false for an error
+ */
+template <class Read>
+bool readEntry(std::vector<char>& buffer, Read read) {
+    constexpr std::size_t firstSize = std::size_t{16} << 10U;
+    constexpr std::size_t largestSize = std::size_t{64} << 20U;
+    int error = ERANGE;
+    for (std::size_t size = firstSize; error == ERANGE && size <= largestSize; size *= 2) {
+        if (buffer.size() < size) {
+            buffer.resize(size);
+        }
+        error = read(buffer.data(), buffer.size());
+    }
+    return error == 0;
+}
+
+}  // namespace cimhost::server
