@@ -102,7 +102,8 @@ TEST_F(ClassOperationsTest, QualifierDeclarationsHaveTheirScope) {
     };
     const auto scopeOf = [&](const std::string& name) {
         std::vector<std::string> scope;
-        for (const auto& [attribute, isInScope] : declared(name).child("SCOPE")->attributes) {
+        const XmlElement declaration = declared(name);
+        for (const auto& [attribute, isInScope] : declaration.child("SCOPE")->attributes) {
             EXPECT_EQ(isInScope, "true");
             scope.push_back(attribute);
         }
