@@ -66,14 +66,14 @@ install_packages() {
     as_root env DEBIAN_FRONTEND=noninteractive apt-get install -y -qq --no-install-recommends "${packages[@]}"
 }
 
-# build PRESET [TARGET...]: configures a preset, with the options in `configuration`, and builds it, or only some of its
+# build PRESET [TARGET...]: configures a preset, with the options in `build_options`, and builds it, or only some of its
 # targets.
-configuration=()
+build_options=()
 build() {
     local preset=$1
     shift
     heading "Building preset $preset"
-    cmake --preset "$preset" "${configuration[@]}"
+    cmake --preset "$preset" "${build_options[@]}"
     cmake --build --preset "$preset" --parallel "$(nproc)" ${1:+--target "$@"}
 }
 
