@@ -113,9 +113,7 @@ def requests_tables(cases):
 
 
 def gate_table(cases):
-    """Returns the time that the gate adds, and its share of the request's time without the gate.
-
-    """
+    """Returns the time that the gate adds, and its share of the request's time without the gate."""
     def cell(times):
         added = times["gated"] - times["alone"]
         return f"{added / 1e3:+.1f} µs ({added / times['alone']:+.1%})"
