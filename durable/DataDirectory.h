@@ -72,7 +72,7 @@ private:
     Stamp stamp() const;
     void remember(const Stamp& stamp);
 
-    /** Whether there is a record file or a copy. @param stamp the present one */
+    /** Whether there is a record file or a saved copy. @param stamp of the directory as it is now */
     bool hasStored(const Stamp& stamp) const;
 
     std::string (*path)();
