@@ -55,7 +55,7 @@ struct OpenResults {
     }
 };
 
-/** Lets record files appear unreadable for lack of descriptors during its lifetime, except for the gate. */
+/** During its lifetime, only the gate can read record files, as if the provider had no free file descriptors. */
 struct UnreadableRecords {
     static inline int count = 0;
 
