@@ -49,7 +49,7 @@ server::Listener listenerFrom(const std::string& argument, bool tls) {
     return listener;
 }
 
-/** Uses the sockets of the service manager, for the listeners with their address and port or besides them. */
+/** Assigns each socket of the service manager to the listener with its address and port, or to a new listener. */
 void addActivated(std::vector<server::Listener>& listeners) {
     for (const server::Listener& each : server::activatedListeners()) {
         const auto same = std::find_if(listeners.begin(), listeners.end(), [&](const server::Listener& other) {

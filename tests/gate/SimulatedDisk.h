@@ -47,7 +47,9 @@ struct Writes {
 private:
     static constexpr std::size_t most = 10;  ///< the number of writes of which all subsets are tried
 
-    /** All subsets. Of many writes, only: the first ones, all without one, and each alone. Each is also there in part.
+    /**
+     * Returns all subsets of the writes; of more than `most` writes, only prefixes, all writes except one, and single
+     * writes. Also returns each of the latter with the one write half done.
      */
     std::vector<WrittenSizes> possible() const {
         std::vector<WrittenSizes> all;
