@@ -119,7 +119,7 @@ TEST_F(ConnectionTableTest, ConnectionsThatAreEndingDoNotCount) {
     EXPECT_TRUE(second.isOpen());
 }
 
-TEST_F(ConnectionTableTest, ANetworkWithTooManyConnectionsLosesOneOfItsOwn) {
+TEST_F(ConnectionTableTest, ANetworkWithTooManyConnectionsLosesOneOfThem) {
     limits.connections = 10;
     limits.connectionsPerAddress = 2;
     const Added& other = add("b");
