@@ -51,7 +51,7 @@ Document Document::read(const std::string& path) {
     }
     Document document;
     if (!file.absent()) {
-        document.problemMessage = path + " cannot be read (" + errorText(file.error) + "); using the defaults";
+        document.whatIsWrong = path + " cannot be read (" + errorText(file.error) + "); using the defaults";
     }
     return document;
 }
@@ -64,23 +64,23 @@ Document Document::readDefault() {
 Document Document::parse(std::string_view text, const std::string& name) {
     Document document;
     if (text.size() > largestDocument) {
-        document.problemMessage =
+        document.whatIsWrong =
             name + " is larger than " + std::to_string(largestDocument) + " bytes; using the defaults";
         return document;
     }
     if (const std::size_t position = cim::findInvalidUtf8(text); position != std::string_view::npos) {
-        document.problemMessage = invalid(name, lineAt(text, position), "a character is not UTF-8");
+        document.whatIsWrong = invalid(name, lineAt(text, position), "a character is not UTF-8");
         return document;
     }
     if (const std::optional<std::size_t> line = lineNestedTooDeep(text)) {
-        document.problemMessage = invalid(name, *line, "nested too deep");
+        document.whatIsWrong = invalid(name, *line, "nested too deep");
         return document;
     }
     try {
         std::istringstream stream{std::string(text)};
         document.content->table = toml::parse<toml::discard_comments, std::map, std::vector>(stream).as_table();
     } catch (const toml::exception& failure) {
-        document.problemMessage = invalid(name, failure.location().line(), reasonOf(failure));
+        document.whatIsWrong = invalid(name, failure.location().line(), reasonOf(failure));
     }
     return document;
 }

@@ -33,7 +33,7 @@ public:
     ~Document();
 
     /** One sentence on why the file could not be used; empty if it was used. */
-    const std::string& problem() const { return problemMessage; }
+    const std::string& problem() const { return whatIsWrong; }
 
     /** Returns a reader of the document. It must not outlive the document or the problems. */
     TableReader root(Problems& problems) const;
@@ -43,7 +43,7 @@ private:
 
     struct Content;
     std::unique_ptr<Content> content;
-    std::string problemMessage;
+    std::string whatIsWrong;
 };
 
 /** Maximum depth of nested brackets, and maximum number of dots in a key. */
