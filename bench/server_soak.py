@@ -133,7 +133,8 @@ class SoakClient(threading.Thread):
 
     def known(self):
         """Returns the identifier of a lease that exists."""
-        return self.random.choice(sorted(self.leases) if self.leases and self.random.random() < 0.5 else self.facts.names)
+        has_own = bool(self.leases) and self.random.random() < 0.5
+        return self.random.choice(sorted(self.leases) if has_own else self.facts.names)
 
     def path(self, name):
         return path_parameter("InstanceName", "VELKO_Lease", name)
@@ -280,8 +281,8 @@ def parse(arguments):
     parser.add_argument("--rate", type=float, default=200, help="requests per second of all clients together; default: "
                         "%(default)s")
     parser.add_argument("--samples", type=int, default=40, help="of the server's resources; default: %(default)s")
-    parser.add_argument("--growth", metavar="KB", type=int, default=1024, help="permitted growth of the server's memory; "
-                        "default: %(default)s")
+    parser.add_argument("--growth", metavar="KB", type=int, default=1024, help="permitted growth of the server's "
+                        "memory; default: %(default)s")
     return parser.parse_args(arguments)
 
 
