@@ -1,6 +1,7 @@
 #include "AssociationModel.h"
 
 #include <algorithm>
+#include <array>
 
 #include "Target.h"
 #include "cim/Names.h"
@@ -26,7 +27,8 @@ struct Association {
     const Store& (*store)();
 };
 
-constexpr Association associations[] = {{"VELKO_LeaseSetting", leaseStore}, {"VELKO_WarrantySetting", warrantyStore}};
+constexpr std::array associationClasses{Association{"VELKO_LeaseSetting", leaseStore},
+                                        Association{"VELKO_WarrantySetting", warrantyStore}};
 
 /** The paths of an association and of its two ends. */
 struct Link {
@@ -80,7 +82,7 @@ std::optional<ObjectPath> resultOf(const Call& call, const Link& link, bool isFr
 
 std::vector<std::string> expectedPaths(const Call& call, const Snapshot& stored, std::size_t computers) {
     std::vector<std::string> paths;
-    for (const Association& association : associations) {
+    for (const Association& association : associationClasses) {
         if (computers != oneComputer || findElement(association, stored) == nullptr) {
             continue;
         }
@@ -103,7 +105,7 @@ std::vector<std::string> expectedPaths(const Call& call, const Snapshot& stored,
 
 /** Checks the values of an association, which are its keys, or of a record. */
 void requireValues(const Call& call, const cimhost::Instance& instance, const Snapshot& stored) {
-    for (const Association& association : associations) {
+    for (const Association& association : associationClasses) {
         const Store& store = association.store();
         if (instance.path.className == store.className) {
             const testsupport::RecordModel model(store.fields());
@@ -118,7 +120,7 @@ void requireValues(const Call& call, const cimhost::Instance& instance, const Sn
 
 /** Whether a request begins at an instance that may have associations, so that it succeeds. */
 bool isTraversal(const Call& call) {
-    return std::any_of(std::begin(associations), std::end(associations), [&](const Association& each) {
+    return std::any_of(std::begin(associationClasses), std::end(associationClasses), [&](const Association& each) {
         const Link link(each, "root/cimv2");
         return isPathOf(call.request.path, link.computer) || isPathOf(call.request.path, link.element);
     });
@@ -126,11 +128,34 @@ bool isTraversal(const Call& call) {
 
 bool isEnumeration(const Call& call) {
     return !call.event && call.request.operation <= Operation::enumerateInstanceNames &&
-           std::any_of(std::begin(associations), std::end(associations),
+           std::any_of(std::begin(associationClasses), std::end(associationClasses),
                        [&](const Association& each) { return cim::sameName(call.request.path.className, each.name); });
 }
 
+/** One of the names that a filter may have; usually none. */
+std::optional<std::string> nextFilter(Bytes& bytes) {
+    constexpr std::array names{computerRole,        elementRole,      "VELKO_LeaseSetting",   "VELKO_WarrantySetting",
+                               "VELKO_Lease",       "VELKO_Warranty", "VELKO_ComputerSystem", "dependent",
+                               "velko_leaseSETTING"};
+    const std::size_t choice = bytes.byte();
+    return choice < 0x80 ? std::nullopt : std::optional<std::string>(names[choice % names.size()]);
+}
+
 }  // namespace
+
+Call nextTraversal(Bytes& bytes) {
+    constexpr std::array operations{Operation::associators, Operation::associatorNames, Operation::references,
+                                    Operation::referenceNames};
+    Call call;
+    call.request.operation = bytes.pick(operations);
+    const Link link(bytes.pick(associationClasses), "root/cimv2");
+    call.request.path = bytes.below(2) == 0 ? link.computer : link.element;
+    cimhost::AssociationFilter& filter = call.request.filter;
+    for (auto* name : {&filter.associationClass, &filter.resultClass, &filter.role, &filter.resultRole}) {
+        *name = nextFilter(bytes);
+    }
+    return call;
+}
 
 void requireAssociations(const Call& call, const cimhost::ProviderResponse& response, const Snapshot& stored,
                          std::size_t computers) {

@@ -8,6 +8,9 @@
 
 namespace fuzz {
 
+/** A request for what is associated with the computer, its lease or its warranty, with any filter. */
+Call nextTraversal(Bytes& bytes);
+
 /**
  * Checks the response to an association operation, or to an enumeration of associations.
  * @param computers the kind of response to enumerations of computers; see SystemUnderTest

@@ -203,7 +203,7 @@ public:
         : bytes(itsBytes), computers(bytes.below(SystemUnderTest::kindsOfComputers)), gate(computers) {}
 
     void performNext() {
-        Call call = nextCall(bytes);
+        Call call = bytes.below(4) == 0 ? nextTraversal(bytes) : nextCall(bytes);
         if (call.event) {
             gate.perform(call);
             return;
@@ -306,7 +306,7 @@ private:
 
     /** Sometimes sends a pull of the other kind, or closes the enumeration, which ends it. */
     bool isClosed(bool ofPaths, const std::string& nameSpace, const std::string& context) {
-        const std::size_t choice = bytes.below(16);
+        const std::size_t choice = bytes.below(8);
         if (choice == 1) {
             requireSame(send(pullRequest(!ofPaths, nameSpace, context, 1)).status.rc, invalidEnumerationContext,
                         "pull of the other kind");
