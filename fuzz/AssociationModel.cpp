@@ -60,7 +60,8 @@ bool admits(const std::optional<std::string>& filter, const std::string& name) {
 
 bool isPathOf(const ObjectPath& sent, const ObjectPath& path) {
     return cim::sameName(sent.className, path.className) && sent.keys.size() == 1 &&
-           keyString(sent, path.keys.front().name.c_str()) == keyString(path, path.keys.front().name.c_str());
+           keyString(sent, path.keys.front().name.string().c_str()) ==
+               keyString(path, path.keys.front().name.string().c_str());
 }
 
 /** The result of a traversal from one end to the other; none if the request does not ask for it. */

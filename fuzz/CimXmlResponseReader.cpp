@@ -150,13 +150,13 @@ std::string elementFor(const cimhost::Request& request, bool isPulled) {
 cimhost::ResultEvent eventIn(const XmlElement& element, const Call& call) {
     const std::string& nameSpace = call.request.path.nameSpace;
     if (element.name == "INSTANCENAME") {
-        return pathIn(element, nameSpace);
+        return std::make_shared<ObjectPath>(pathIn(element, nameSpace));
     }
     if (element.name == "INSTANCEPATH") {
-        return fullPathIn(element);
+        return std::make_shared<ObjectPath>(fullPathIn(element));
     }
     if (element.name == "OBJECTPATH") {
-        return fullPathIn(onlyChild(element, "INSTANCEPATH"));
+        return std::make_shared<ObjectPath>(fullPathIn(onlyChild(element, "INSTANCEPATH")));
     }
     if (element.name == "INSTANCE") {
         ObjectPath path = call.request.path;

@@ -55,11 +55,16 @@ public:
     void appendValue(std::string& xml, const Value& value) const;
 
 private:
+    /**
+     * The tags around the content of a property or a key. The objects that a thread writes usually have the same
+     * properties and keys in the same order, so it keeps the tags by position.
+     */
+    struct Tags;
+
     void appendNameSpacePath(std::string& xml, const ObjectPath& path) const;
     void appendLocalNameSpacePath(std::string& xml, const std::string& itsNameSpace) const;
-    void appendProperty(std::string& xml, const NamedValue& property, std::string_view origin,
-                        std::size_t position) const;
-    void appendKey(std::string& xml, const NamedValue& key, std::size_t position) const;
+    void appendProperty(std::string& xml, const NamedValue& property, std::string_view origin, Tags& tags) const;
+    void appendKey(std::string& xml, const NamedValue& key, Tags& tags) const;
     void appendReference(std::string& xml, const ObjectPath& path) const;
     void appendContent(std::string& xml, const Value& value) const;
     void appendScalar(std::string& xml, const Scalar& scalar) const;
