@@ -74,7 +74,9 @@ std::optional<HttpResponse> checkBody(const Headers& headers, std::size_t larges
     }
     const auto encoding = headerIn(headers, "Content-Encoding");
     const auto type = headerIn(headers, "Content-Type");
-    if (!type || !isUtf8Xml(*type) || (encoding && !cim::sameName(*encoding, "identity"))) {
+    const bool isEncoded =
+        headers.count("Content-Encoding") != 0 && !(encoding && cim::sameName(*encoding, "identity"));
+    if (!type || !isUtf8Xml(*type) || isEncoded) {
         return refusal(415, "Send application/xml or text/xml in UTF-8.");
     }
     return std::nullopt;
@@ -92,9 +94,9 @@ std::optional<HttpResponse> checkProtocol(const Headers& headers, const std::str
         return refusal(400, "The header CIMOperation must be MethodCall.");
     }
     const auto version = headerIn(headers, prefix + "CIMProtocolVersion");
-    if (version && version->rfind("1.", 0) != 0) {
-        return refusal(400, "Protocol version " + *version + " is not supported; send 1.0.",
-                       "unsupported-protocol-version");
+    const bool hasVersion = headers.count(prefix + "CIMProtocolVersion") != 0;
+    if (hasVersion && (!version || version->rfind("1.", 0) != 0)) {
+        return refusal(400, "The header CIMProtocolVersion must be 1.0.", "unsupported-protocol-version");
     }
     return std::nullopt;
 }

@@ -105,6 +105,15 @@ TEST_F(HeaderCheckTest, ProtocolVersionsAndGroupsOfTheFutureAreRefused) {
     EXPECT_EQ(with("CIMBatch", "").with("CIMExport", "x").result(), "501 unsupported-operation");
 }
 
+TEST_F(HeaderCheckTest, HeadersThatAreThereTwiceAreRefused) {
+    with("CIMProtocolVersion", "1.0");
+    request.headers.emplace("CIMProtocolVersion", "2.0");
+    EXPECT_EQ(result(), "400 unsupported-protocol-version");
+    with("CIMProtocolVersion", "").with("Content-Encoding", "identity");
+    request.headers.emplace("Content-Encoding", "gzip");
+    EXPECT_EQ(result(), "415");
+}
+
 TEST_F(HeaderCheckTest, OnlyXmlInUtf8IsAccepted) {
     for (const char* type : {"text/xml", "application/xml", "TEXT/XML; charset=UTF-8", "text/xml;charset=utf-8"}) {
         EXPECT_EQ(with("Content-Type", type).result(), "200") << type;
