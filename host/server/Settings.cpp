@@ -30,6 +30,7 @@ void readLimits(TableReader table, Limits& limits) {
     readNumber(table, "connections", limits.connections, 100'000);
     readNumber(table, "connections_per_address", limits.connectionsPerAddress, 100'000);
     readNumber(table, "requests_at_work", limits.requestsAtWork, 10'000);
+    readNumber(table, "response_results", limits.responseResults, 1'000'000'000);
     readNumber(table, "request_bytes", limits.requestBytes, std::int64_t{1} << 30U);
     readNumber(table, "xml_depth", limits.xmlDepth, 200);
     readNumber(table, "xml_elements", limits.xmlElements, 10'000'000);

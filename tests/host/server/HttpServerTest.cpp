@@ -156,6 +156,28 @@ TEST_F(HttpServerTest, AFloodOfSlowReadersLeavesOthersServed) {
     EXPECT_THAT(response, StartsWith("HTTP/1.1 200 "));
 }
 
+TEST_F(HttpServerTest, ALongResponseWaitsForSlowReadersUntilTheyAreEnded) {
+    settings.limits.responseResults = 2'000;
+    settings.limits.queueTime = 1h;
+    manager.answerWith([](const Request&) { return largeResponse(); });
+    const Socket slow = slowReader();
+    const Socket other = slowReader();  // its response begins after the other has ended
+    slow.receive();
+}
+
+TEST_F(HttpServerTest, ResultsThatClientsHaveNotReceivedAreLimited) {
+    settings.limits.responseResults = 2'000;
+    settings.limits.queueTime = 0s;
+    manager.answerWith([](const Request&) { return largeResponse(); });
+    const Socket slow = slowReader();
+    const Socket refused = connect();
+    refused.send(requestOf(reader));
+    EXPECT_THAT(refused.receiveUntil("have not received their results yet"),
+                testing::AllOf(StartsWith("HTTP/1.1 503 "), HasSubstr("Retry-After: 5\r\n")));
+    manager.answerWith([](const Request&) { return Response{}; });
+    EXPECT_THAT(served(refused), StartsWith("HTTP/1.1 200 "));
+}
+
 TEST_F(HttpServerTest, AMissingPasswordIsRefusedBeforeTheBodyArrives) {
     const Socket client = connect();
     client.send(requestOf("", false));
@@ -193,6 +215,26 @@ TEST_F(HttpServerTest, ARequestThatWaitsTooLongForOthersIsRefused) {
                 testing::AllOf(StartsWith("HTTP/1.1 503 "), HasSubstr("Retry-After: 5\r\n")));
     EXPECT_THAT(other.finish(), StartsWith("HTTP/1.1 200 "));
     EXPECT_THAT(served(connect()), StartsWith("HTTP/1.1 200 "));
+}
+
+TEST_F(HttpServerTest, APasswordThatWaitsTooLongForOthersIsNotChecked) {
+    settings.limits.queueTime = 0s;
+    std::promise<void> begun;
+    std::promise<void> finished;
+    authenticator.beforeAnswer = [&, isFinished = finished.get_future().share()] {
+        begun.set_value();
+        isFinished.wait();
+    };
+    const Socket first = connect();
+    first.send(requestOf(reader));
+    begun.get_future().wait();
+    const Socket second = connect();
+    second.send(requestOf(writer));
+    EXPECT_THAT(second.receiveUntil("too many passwords"),
+                testing::AllOf(StartsWith("HTTP/1.1 503 "), HasSubstr("Retry-After: 5\r\n")));
+    EXPECT_EQ(authenticator.asked, 1);
+    finished.set_value();
+    EXPECT_THAT(first.receiveUntil("</CIM>\n"), StartsWith("HTTP/1.1 200 "));
 }
 
 TEST_F(HttpServerTest, ARequestWaitsForOthersAtWork) {
