@@ -34,10 +34,10 @@ RequestHandler::RequestHandler(const Settings& itsSettings, cimxml::Operations& 
       results(itsSettings.limits.responseResults) {}
 
 std::optional<HttpResponse> RequestHandler::begin(Exchange& exchange, const HttpRequest& request) {
-    const std::string length = headerIn(request.headers, "Content-Length").value_or("0");
     exchange.extensionPrefix = extensionPrefixOf(request);
     auto refused = check(exchange, request);
-    exchange.isBodyIgnored = refused && (length != "0" || request.headers.count("Transfer-Encoding") != 0);
+    exchange.isBodyIgnored = refused && mayHaveBody(request.headers);
+    exchange.length = lengthIn(request.headers);
     return refused ? std::optional(withExtension(*refused, exchange.extensionPrefix)) : std::nullopt;
 }
 
@@ -126,6 +126,11 @@ Reply RequestHandler::finish(Exchange& exchange) {
 Reply RequestHandler::answer(Exchange& exchange) {
     if (exchange.refused) {
         return *exchange.refused;
+    }
+    if (exchange.length.value_or(exchange.body.size()) != exchange.body.size()) {
+        // The HTTP library ignores a Content-Length in a continued header line.
+        exchange.isBodyIgnored = true;
+        return refusal(400, "The body does not have the length that Content-Length says.");
     }
     exchange.connection->trust();
     const Quota::Share share(requests, 1, settings.limits.queueTime);

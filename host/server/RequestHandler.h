@@ -29,6 +29,7 @@ struct Exchange {
     CimHeaders headers{};           ///< of a request that has passed the checks
     std::string extensionPrefix{};  ///< of the headers of an M-POST request, else empty
     cimxml::Caller caller{};
+    std::optional<std::uint64_t> length{};  ///< of the body, if a header has it
     std::string body{};
     bool isBodyIgnored = false;             ///< whether the response is sent before the body has arrived
     std::optional<HttpResponse> refused{};  ///< the response to a body that is too large, once its rest has arrived
