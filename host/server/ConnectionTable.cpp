@@ -90,7 +90,9 @@ void Connection::end(Cause why) {
         return;
     }
     cause = why;
-    if (why == Cause::time && current == Phase::body) {
+    // During the head, the thread of a TLS connection may be sending a refusal.
+    const bool hasSlowHead = current == Phase::idle && headSince != Clock::time_point{} && !tls;
+    if (why == Cause::time && (current == Phase::body || hasSlowHead)) {
         sendTimeout();
     }
     ::shutdown(descriptor, SHUT_RDWR);

@@ -107,10 +107,10 @@ private:
 };
 
 /**
- * All connections. Ends those that exceed a time limit; a client that sends its body too slowly receives 408. If there
- * are too many connections, of one network or altogether, each new one ends another: first those that were refused,
- * then those without an accepted password or request, then those whose body does not arrive, then idle ones, then those
- * that do not receive their response, at last those whose body arrives; of several the oldest.
+ * All connections. Ends those that exceed a time limit; a client that sends its request too slowly receives 408. If
+ * there are too many connections, of one network or altogether, each new one ends another: first those that were
+ * refused, then those without an accepted password or request, then those whose body does not arrive, then idle ones,
+ * then those that do not receive their response, at last those whose body arrives; of several the oldest.
  */
 class ConnectionTable {
 public:

@@ -13,9 +13,6 @@ namespace {
 
 constexpr std::size_t headSize = std::size_t{64} << 10U;  ///< of a request, with its target; also the send buffer
 
-/** Connections that the HTTP library may have besides the limit: those that are being ended for new ones. */
-constexpr std::size_t endingConnections = 128;
-
 using Response = std::unique_ptr<MHD_Response, decltype(&MHD_destroy_response)>;
 
 /** The text of a response that is sent in blocks. */

@@ -173,7 +173,7 @@ TEST_F(HttpServerTest, ResultsThatClientsHaveNotReceivedAreLimited) {
     const Socket slow = slowReader();
     const Socket refused = connect();
     refused.send(requestOf(reader));
-    EXPECT_THAT(refused.receiveUntil("have not received their results yet"),
+    EXPECT_THAT(refused.receiveUntil("have not received their results yet.\n"),
                 testing::AllOf(StartsWith("HTTP/1.1 503 "), HasSubstr("Retry-After: 5\r\n")));
     manager.answerWith([](const Request&) { return Response{}; });
     EXPECT_THAT(served(refused), StartsWith("HTTP/1.1 200 "));
@@ -279,7 +279,7 @@ TEST_F(HttpServerTest, APasswordThatWaitsTooLongForOthersIsNotChecked) {
     begun.get_future().wait();
     const Socket second = connect();
     second.send(requestOf(writer));
-    EXPECT_THAT(second.receiveUntil("too many passwords"),
+    EXPECT_THAT(second.receiveUntil("too many passwords to check.\n"),
                 testing::AllOf(StartsWith("HTTP/1.1 503 "), HasSubstr("Retry-After: 5\r\n")));
     EXPECT_EQ(authenticator.asked, 1);
     finished.set_value();
