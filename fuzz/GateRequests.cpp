@@ -119,7 +119,7 @@ struct Snapshot {
 bool canBeStored(const Call& call, bool isRecord) {
     const auto& values = call.request.instance.properties;
     return std::all_of(values.begin(), values.end(), [&](const cimhost::NamedValue& each) {
-        const auto value = givenString(call.request.instance, each.name.c_str());
+        const auto value = givenString(call.request.instance, each.name.string().c_str());
         return !value || (isRecord ? value->size() > 1 : value->find(':') == std::string::npos);
     });
 }

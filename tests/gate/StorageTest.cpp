@@ -212,7 +212,7 @@ std::multiset<std::string> content(const Outcome& leases) {
     for (const Instance& instance : leases.instances()) {
         std::string text;
         for (const NamedValue& property : instance.properties) {
-            text += property.name + "=" + valueIn(instance, property.name).value_or("(null)") + ";";
+            text += property.name.string() + "=" + valueIn(instance, property.name).value_or("(null)") + ";";
         }
         shown.insert(text);
     }
