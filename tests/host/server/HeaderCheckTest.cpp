@@ -124,6 +124,28 @@ TEST_F(HeaderCheckTest, OnlyXmlInUtf8IsAccepted) {
     EXPECT_EQ(with("Content-Type", "text/xml").with("Content-Encoding", "gzip").result(), "415");
 }
 
+TEST_F(HeaderCheckTest, HeadsThatOtherSoftwareReadsDifferentlyAreRefused) {
+    const HttpRequest accepted = request;
+    for (const auto& [name, value] : {std::pair{"Content-Length ", "100"},
+                                      {"Content-Length", "100"},
+                                      {"Host", "localhost"},
+                                      {"Transfer-Encoding", "chunked"},
+                                      {"X", "a\rTransfer-Encoding: chunked"}}) {
+        request.headers.emplace(name, value);
+        EXPECT_EQ(result(), "400") << name << ": " << value;
+        EXPECT_TRUE(mayHaveBody(request.headers)) << name << ": " << value;
+        request = accepted;
+    }
+    with("Content-Length", "");
+    for (const char* encoding : {"identity", "gzip, chunked", "chunked, identity", "xchunked"}) {
+        EXPECT_EQ(with("Transfer-Encoding", encoding).result(), "400") << encoding;
+    }
+    EXPECT_EQ(with("Transfer-Encoding", "Chunked").result(), "200");
+    request.method = "OPTIONS";
+    request.headers.emplace("Transfer-Encoding", "chunked");
+    EXPECT_EQ(result(), "400");
+}
+
 TEST_F(HeaderCheckTest, TheLengthIsLimitedAndUnambiguous) {
     EXPECT_EQ(with("Content-Length", "1000").result(), "200");
     EXPECT_EQ(with("Content-Length", "1001").result(), "413");
