@@ -103,12 +103,11 @@ std::string_view elementOfContent(const Value& value) {
     return value.type == CMPI_ref ? "" : "VALUE";
 }
 
-std::string startTagOf(const NamedValue& property, const Property* declared) {
-    std::string xml;
+void appendStartTagOf(std::string& xml, const NamedValue& property, std::string_view origin) {
     appendStartTag(xml, elementOf(property.value), [&] {
         appendAttribute(xml, "NAME", property.name);
-        if (declared != nullptr) {
-            appendAttribute(xml, "CLASSORIGIN", declared->origin);
+        if (!origin.empty()) {
+            appendAttribute(xml, "CLASSORIGIN", origin);
         }
         if (property.value.type != CMPI_ref) {
             appendAttribute(xml, "TYPE", xmlType(property.value.type));
@@ -117,7 +116,36 @@ std::string startTagOf(const NamedValue& property, const Property* declared) {
             appendAttribute(xml, "EmbeddedObject", "instance");
         }
     });
-    return xml;
+}
+
+/** The tags around the content of a property or a key, and what they depend on. */
+struct Tags {
+    std::string name{};
+    CMPIType type = CMPI_null;
+    bool isArray = false;
+    bool isNull = true;
+    std::string origin{};
+    std::string start{};
+    std::string end{};
+};
+
+/** By position: the objects that a thread writes usually have the same properties and keys in the same order. */
+using TagsByPosition = std::vector<Tags>;
+
+/** The tags that the last object had at this position if they are right for this one, or new ones. */
+template <class Make>
+const Tags& tagsFrom(TagsByPosition& known, std::size_t position, const NamedValue& named, std::string_view origin,
+                     Make make) {
+    known.resize(std::max(known.size(), position + 1));
+    Tags& tags = known[position];
+    const Value& value = named.value;
+    const bool areSame = tags.name == named.name && tags.type == value.type && tags.isArray == value.isArray &&
+                         tags.isNull == value.isNull && tags.origin == origin && !tags.start.empty();
+    if (!areSame) {
+        tags = {named.name, value.type, value.isArray, value.isNull, std::string(origin)};
+        make(tags);
+    }
+    return tags;
 }
 
 /** References and embedded instances have elements inside of their value. */
@@ -202,22 +230,24 @@ void ObjectWriter::appendInstance(std::string& xml, const Instance& instance, co
     std::size_t position = 0;
     for (const NamedValue& property : instance.properties) {
         if (parts.haveAllProperties() || isWanted(property.name, parts)) {
-            appendProperty(xml, property, known != nullptr ? known->findProperty(property.name) : nullptr, position++);
+            const Property* declared = known != nullptr ? known->findProperty(property.name) : nullptr;
+            appendProperty(xml, property, declared != nullptr ? declared->origin : std::string_view(), position++);
         }
     }
 }
 
-void ObjectWriter::appendProperty(std::string& xml, const NamedValue& property, const Property* declared,
+void ObjectWriter::appendProperty(std::string& xml, const NamedValue& property, std::string_view origin,
                                   std::size_t position) const {
     const Value& value = property.value;
     if (!isSimple(value)) {
-        xml += startTagOf(property, declared);
+        appendStartTagOf(xml, property, origin);
         appendValue(xml, value);
         return appendEndTag(xml, elementOf(value));
     }
-    const Tags& tags = tagsFrom(ofProperties, position, property, declared, [&](Tags& made) {
+    thread_local TagsByPosition ofProperties;
+    const Tags& tags = tagsFrom(ofProperties, position, property, origin, [&](Tags& made) {
         const std::string_view content = elementOfContent(value);
-        made.start = startTagOf(property, declared);
+        appendStartTagOf(made.start, property, origin);
         if (!content.empty()) {
             appendStartTag(made.start, content, [] {});
             appendEndTag(made.end, content);
@@ -227,21 +257,6 @@ void ObjectWriter::appendProperty(std::string& xml, const NamedValue& property, 
     xml += tags.start;
     appendContent(xml, value);
     xml += tags.end;
-}
-
-template <class Make>
-const ObjectWriter::Tags& ObjectWriter::tagsFrom(TagsByPosition& known, std::size_t position, const NamedValue& named,
-                                                 const Property* declared, Make make) {
-    known.resize(std::max(known.size(), position + 1));
-    Tags& tags = known[position];
-    const Value& value = named.value;
-    const bool areSame = tags.name == named.name && tags.type == value.type && tags.isArray == value.isArray &&
-                         tags.isNull == value.isNull && tags.declared == declared && !tags.start.empty();
-    if (!areSame) {
-        tags = {named.name, value.type, value.isArray, value.isNull, declared};
-        make(tags);
-    }
-    return tags;
 }
 
 void ObjectWriter::appendValue(std::string& xml, const Value& value) const {
@@ -309,7 +324,8 @@ void ObjectWriter::appendKey(std::string& xml, const NamedValue& key, std::size_
         appendContent(xml, key.value);
         return appendEndTag(xml, "KEYBINDING");
     }
-    const Tags& tags = tagsFrom(ofKeys, position, key, nullptr, [&](Tags& made) {
+    thread_local TagsByPosition ofKeys;
+    const Tags& tags = tagsFrom(ofKeys, position, key, {}, [&](Tags& made) {
         appendBinding(made.start);
         appendStartTag(made.start, "KEYVALUE", [&] {
             appendAttribute(made.start, "VALUETYPE", valueTypeOf(key.value.type));
