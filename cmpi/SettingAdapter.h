@@ -5,6 +5,7 @@
 #include <string>
 
 #include "CMPIComputerSystem.h"
+#include "KO/ClassIds.h"
 
 namespace KO::LeaseWarrantyProvider {
 
@@ -22,7 +23,7 @@ namespace KO::LeaseWarrantyProvider {
  *   Element, Setting                    adapter of the lease or warranty, and element of the association
  *   associationClass, elementClass      the CIM classes
  *   associationClassId, elementClassId  their class ids
- *   constructor, destructor, locate     names in the log; locateElement is traced as `locate`
+ *   constructor, locate                 names in the log; locateElement is traced as `locate`
  *   traceSource                         trace source
  *   elementMoniker(setting, moniker)    translates a computer's moniker to that of its lease or warranty
  */
@@ -75,9 +76,13 @@ protected:
     CMPIObjectPath* locateElement(const CMPIObjectPath* computerPath);
 
 private:
-    enum class Mode { computerSource, elementSource, associationList, inert };
+    /** @name Class of the request's path; all false for a class without results */
+    ///@{
+    bool isFromComputer() const { return requestedClassId == ClassId::computerSystem; }
+    bool isFromElement() const { return requestedClassId == Traits::elementClassId; }
+    bool isAssociationList() const { return requestedClassId == Traits::associationClassId; }
+    ///@}
 
-    Mode mode() const;
     void position(const CMPIObjectPath* path);
 
     template <class Translate>

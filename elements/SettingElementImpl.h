@@ -7,6 +7,7 @@
 #include <new>
 #include <string>
 
+#include "FixedString.h"
 #include "KO/Exceptions.h"
 #include "SettingElement.h"
 
@@ -79,7 +80,7 @@ SettingElement<Traits>::SettingElement() {
 
 template <class Traits>
 SettingElement<Traits>::~SettingElement() noexcept(false) {
-    traceMethod(at(Traits::traceSource, Level::flow, Traits::destructor));
+    traceMethod(at(Traits::traceSource, Level::flow, destructorName<Traits>));
 }
 
 template <class Traits>

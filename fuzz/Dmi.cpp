@@ -10,7 +10,7 @@
 #include "MemoryFile.h"
 #include "Target.h"
 #include "cim/Utf8.h"
-#include "framework/ComputerDiscovery.h"
+#include "framework/NodeTree.h"
 
 // Strings of the firmware: any of them results in nodes with readable names. Readable names are not changed.
 

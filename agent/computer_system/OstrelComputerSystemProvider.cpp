@@ -2,18 +2,88 @@
 
 #include <atomic>
 #include <exception>
+#include <optional>
+#include <string>
+#include <vector>
 
-#include "Computer.h"
 #include "Export.h"
 #include "KO/ClassIds.h"
+#include "KO/Instrumentation.h"
 #include "KO/ProviderUtilities.h"
 #include "cim/CmpiAccess.h"
+#include "cim/Names.h"
 
 // Serves VELKO_ComputerSystem, read-only. Requests share only the broker, and may run concurrently.
 
 namespace KO::ComputerSystem {
 
 namespace {
+
+constexpr const char* className = "VELKO_ComputerSystem";
+constexpr const char* keyName = "Name";
+
+/** A computer of the agent's instrumentation tree, as the class shows it. */
+struct Computer {
+    std::string name;  ///< the key
+    std::optional<std::string> vendor;
+    std::optional<std::string> productName;  ///< "model - suffix"
+};
+
+/** The part of the product name before its first dash; none without product name. */
+std::optional<std::string> modelOf(const Computer& computer) {
+    if (!computer.productName) {
+        return std::nullopt;
+    }
+    std::string text = computer.productName->substr(0, computer.productName->find('-'));
+    text.erase(text.find_last_not_of(' ') + 1);
+    return text;
+}
+
+/** One property of the class: its CIM name and its value. */
+struct Property {
+    const char* name;
+    std::optional<std::string> (*value)(const Computer& computer);
+};
+
+const Property classProperties[] = {
+    {keyName, [](const Computer& computer) { return std::make_optional(computer.name); }},
+    {"Caption", [](const Computer&) { return std::make_optional<std::string>("Computer System"); }},
+    {"Description", [](const Computer& computer) { return std::make_optional("Computer system " + computer.name); }},
+    {"ElementName", [](const Computer& computer) { return std::make_optional(computer.name); }},
+    {"Vendor", [](const Computer& computer) { return computer.vendor; }},
+    {"Model", [](const Computer& computer) { return modelOf(computer); }},
+    {"ProductName", [](const Computer& computer) { return computer.productName; }},
+};
+
+std::optional<std::string> read(Instrumentation& node, NodeLexicon::Properties property) {
+    std::string text;
+    return node.getProperty(property, text) ? std::make_optional(text) : std::nullopt;
+}
+
+bool isWanted(const char* name, const char** wanted) {
+    if (wanted == nullptr || cim::sameName(name, keyName)) {
+        return true;
+    }
+    for (; *wanted != nullptr; ++wanted) {
+        if (cim::sameName(name, *wanted)) {
+            return true;
+        }
+    }
+    return false;
+}
+
+/** All computers of the tree that have a name, in tree order. */
+std::vector<Computer> allComputers() {
+    std::vector<Computer> computers;
+    Instrumentation node;
+    for (node.selectNode(NodeLexicon::NT_COMPUTER); node; ++node) {
+        if (const std::optional<std::string> name = read(node, NodeLexicon::PROPERTY_NAME)) {
+            computers.push_back(
+                {*name, read(node, NodeLexicon::PROPERTY_VENDOR), read(node, NodeLexicon::PROPERTY_PRODUCT_NAME)});
+        }
+    }
+    return computers;
+}
 
 std::atomic<const CMPIBroker*> theBroker{nullptr};
 
@@ -37,18 +107,35 @@ struct ResultWriter {
         : broker(theBroker), result(itsResult), nameSpace(ProviderUtilities::getNamespace(path)) {}
 
     CMPIStatus returnPath(const Computer& computer) const {
-        const CMPIObjectPath* path = makePath(broker, nameSpace, computer);
+        const CMPIObjectPath* path = makePath(computer);
         return path != nullptr ? result->ft->returnObjectPath(result, path) : cannotMake();
     }
 
-    CMPIStatus returnInstance(const Computer& computer, const char** properties) const {
-        const CMPIInstance* instance = makeInstance(broker, nameSpace, computer, properties);
-        return instance != nullptr ? result->ft->returnInstance(result, instance) : cannotMake();
+    /** @param wanted names of properties in any letter case, ended by null; null for all. The key is always returned.
+     */
+    CMPIStatus returnInstance(const Computer& computer, const char** wanted) const {
+        CMPIInstance* instance = ProviderUtilities::createInstance(broker, makePath(computer));
+        if (instance == nullptr) {
+            return cannotMake();
+        }
+        for (const Property& property : classProperties) {
+            auto value = isWanted(property.name, wanted) ? property.value(computer) : std::nullopt;
+            if (value) {
+                ProviderUtilities::setProperty(instance, property.name, *value);
+            }
+        }
+        return result->ft->returnInstance(result, instance);
     }
 
     CMPIStatus done() const { return result->ft->returnDone(result); }
 
 private:
+    CMPIObjectPath* makePath(const Computer& computer) const {
+        CMPIObjectPath* path = ProviderUtilities::createObjectPath(broker, className, nameSpace);
+        ProviderUtilities::setKeyProperty(path, keyName, computer.name);
+        return path;
+    }
+
     static CMPIStatus cannotMake() {
         return status(CMPI_RC_ERR_FAILED, "The object manager could not make an object of VELKO_ComputerSystem");
     }
@@ -105,7 +192,7 @@ CMPIStatus getInstance(CMPIInstanceMI* /*mi*/, const CMPIContext* /*context*/, c
                        const CMPIObjectPath* path, const char** properties) {
     return guarded(path, [&] {
         std::string name;
-        if (!ProviderUtilities::getKeyProperty(path, "Name", name)) {
+        if (!ProviderUtilities::getKeyProperty(path, keyName, name)) {
             return status(CMPI_RC_ERR_INVALID_PARAMETER, "The key Name is missing or is not a string");
         }
         const ResultWriter writer(result, path);

@@ -28,10 +28,6 @@ public:
     /** Parses a document; problems contain the name. */
     static Document parse(std::string_view text, const std::string& name);
 
-    Document(Document&&) noexcept;
-    Document& operator=(Document&&) noexcept;
-    ~Document();
-
     /** One sentence on why the file could not be used; empty if it was used. */
     const std::string& problem() const { return whatIsWrong; }
 
@@ -39,11 +35,8 @@ public:
     TableReader root(Problems& problems) const;
 
 private:
-    Document();
-
-    struct Content;
-    std::unique_ptr<Content> content;
-    std::string whatIsWrong;
+    std::shared_ptr<const TomlTable> table{};  ///< null for an empty document
+    std::string whatIsWrong{};
 };
 
 /** Maximum depth of nested brackets, and maximum number of dots in a key. */

@@ -28,6 +28,10 @@ bool isArrayOfTables(const TomlValue& value) {
     return value.is_array() && std::all_of(value.as_array().begin(), value.as_array().end(), isTable);
 }
 
+bool isArrayOfStrings(const TomlValue& value) {
+    return value.is_array() && std::all_of(value.as_array().begin(), value.as_array().end(), isString);
+}
+
 }  // namespace
 
 TableReader::TableReader(const TomlTable* table, std::string name, Problems& problemList)
@@ -82,13 +86,8 @@ std::optional<std::int64_t> TableReader::number(std::string_view key, std::int64
 }
 
 std::optional<std::vector<std::string>> TableReader::strings(std::string_view key) {
-    const TomlValue* value = find(key);
+    const TomlValue* value = find(key, isArrayOfStrings, "must be an array of strings");
     if (value == nullptr) {
-        return std::nullopt;
-    }
-    const auto isString = [](const TomlValue& each) { return each.is_string(); };
-    if (!value->is_array() || !std::all_of(value->as_array().begin(), value->as_array().end(), isString)) {
-        reject(key, "must be an array of strings");
         return std::nullopt;
     }
     std::vector<std::string> found;

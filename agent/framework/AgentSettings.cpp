@@ -1,7 +1,6 @@
 #include <systemd/sd-id128.h>
 
 #include <charconv>
-#include <initializer_list>
 
 #include "framework/AgentState.h"
 
@@ -49,11 +48,7 @@ void readProduct(Agent::TableReader table, AgentSettings& settings) {
     product.name = table.nonEmptyString("name").value_or("Ostrel");
     product.version = table.nonEmptyString("version").value_or(AGENT_VERSION);
     product.buildNumber = table.nonEmptyString("build_number").value_or("1");
-    if (std::optional<std::string> number = table.nonEmptyString("identifying_number")) {
-        product.identifyingNumber = std::move(*number);
-    } else {
-        product.identifyingNumber = defaultIdentifyingNumber();
-    }
+    product.identifyingNumber = table.nonEmptyString("identifying_number").value_or(defaultIdentifyingNumber());
     product.vendor = table.nonEmptyString("vendor").value_or("VEL");
     table.rejectUnknownKeys();
 }
@@ -102,13 +97,9 @@ void readInstrumentation(Agent::TableReader table, AgentSettings& settings) {
     table.rejectUnknownKeys();
 }
 
-/** Reads flags for KO::Settings: a table and its keys. */
-void readFlags(Agent::TableReader table, const std::string& name, std::initializer_list<const char*> keys,
-               AgentSettings& settings) {
-    for (const char* key : keys) {
-        if (const std::optional<bool> flag = table.flag(key)) {
-            settings.flags[name + '.' + key] = *flag;
-        }
+void readGate(Agent::TableReader table, AgentSettings& settings) {
+    if (const std::optional<bool> refuses = table.flag("refuse_lossy_values")) {
+        settings.flags["gate.refuse_lossy_values"] = *refuses;
     }
     table.rejectUnknownKeys();
 }
@@ -121,7 +112,7 @@ AgentSettings readAgentSettings(const Agent::Document& document, Agent::Problems
     readDirectories(root.table("directories"), settings);
     readProduct(root.table("product"), settings);
     readInstrumentation(root.table("instrumentation"), settings);
-    readFlags(root.table("gate"), "gate", {"refuse_lossy_values"}, settings);
+    readGate(root.table("gate"), settings);
     root.has("log");  // read by the logging library
     root.rejectUnknownKeys();
     return settings;

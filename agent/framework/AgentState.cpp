@@ -2,8 +2,11 @@
 
 #include <mutex>
 
+#include "KO/PlatformUtilities.h"
+#include "KO/Product.h"
+#include "KO/Settings.h"
+#include "KO/Strings.h"
 #include "RZLog/RZLogger.h"
-#include "framework/ComputerDiscovery.h"
 
 namespace KO {
 
@@ -55,6 +58,38 @@ void forgetAgentState() {
     const std::lock_guard<std::mutex> lock(agentMutex);
     delete agent;
     agent = nullptr;
+}
+
+// The parts of the configuration that the framework's interface returns.
+
+bool Settings::getFlag(const std::string& name, bool otherwise) {
+    const auto state = agentState();
+    const auto found = state->settings.flags.find(name);
+    return found == state->settings.flags.end() ? otherwise : found->second;
+}
+
+// The strings outlive the calls: the state is destroyed when the library is unloaded.
+const char* PlatformUtilities::getKelsaDirectory() {
+    return agentState()->settings.installDirectory.c_str();
+}
+const char* PlatformUtilities::getKelsaDataDir() {
+    return agentState()->settings.dataDirectory.c_str();
+}
+
+std::wstring Product::getName() {
+    return make_wstring(agentState()->settings.product.name);
+}
+std::wstring Product::getVersion() {
+    return make_wstring(agentState()->settings.product.version);
+}
+std::wstring Product::getBuildNumber() {
+    return make_wstring(agentState()->settings.product.buildNumber);
+}
+std::wstring Product::getIdentifyingNumber() {
+    return make_wstring(agentState()->settings.product.identifyingNumber);
+}
+std::wstring Product::getVendor() {
+    return make_wstring(agentState()->settings.product.vendor);
 }
 
 }  // namespace KO

@@ -1,5 +1,3 @@
-#include "framework/ComputerDiscovery.h"
-
 #include <unistd.h>
 
 #include <algorithm>
@@ -9,6 +7,7 @@
 #include "cim/Names.h"
 #include "cim/Utf8.h"
 #include "configuration/FileContent.h"
+#include "framework/NodeTree.h"
 
 namespace KO {
 

@@ -4,6 +4,8 @@
 #include <string>
 #include <vector>
 
+#include "configuration/TableReader.h"
+
 namespace KO {
 
 /** A node of the instrumentation tree. Types and property numbers are those of KO::NodeLexicon. */
@@ -24,6 +26,18 @@ public:
 private:
     std::vector<Node> allNodes;
 };
+
+/** Returns this computer's host name; "localhost" if the system has none. */
+std::string hostName();
+
+/**
+ * The nodes of this computer: the system, and below it the computer, both with its name, vendor and
+ * product name.
+ * @param dmiRoot directory of the kernel's DMI files, ending with a separator
+ * @param name    the computer's name
+ * @param problems receives a sentence for each existing file that cannot be read
+ */
+NodeTree discoverComputer(const std::string& dmiRoot, const std::string& name, Agent::Problems& problems);
 
 /**
  * Encodes a node path: every byte except letters, digits and . / : - becomes %NN, with the byte in upper-case

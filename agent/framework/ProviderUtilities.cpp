@@ -35,8 +35,11 @@ const CMPIValue* asValue(const char* characters) {
     return reinterpret_cast<const CMPIValue*>(characters);
 }
 
-cim::Answer<CMPIData> getKey(const CMPIObjectPath* path, const char* name) {
-    return name != nullptr ? cim::ask<&CMPIObjectPathFT::getKey>(path, name) : cim::Answer<CMPIData>{};
+/** The result of reading a key or a property. */
+using Read = cim::Answer<CMPIData>;
+
+Read getKey(const CMPIObjectPath* path, const char* name) {
+    return name != nullptr ? cim::ask<&CMPIObjectPathFT::getKey>(path, name) : Read{};
 }
 
 void addKey(CMPIObjectPath* path, const char* name, const CMPIValue* value, CMPIType type) {
@@ -45,8 +48,8 @@ void addKey(CMPIObjectPath* path, const char* name, const CMPIValue* value, CMPI
     }
 }
 
-cim::Answer<CMPIData> getPropertyData(const CMPIInstance* instance, const char* name) {
-    return name != nullptr ? cim::ask<&CMPIInstanceFT::getProperty>(instance, name) : cim::Answer<CMPIData>{};
+Read getPropertyData(const CMPIInstance* instance, const char* name) {
+    return name != nullptr ? cim::ask<&CMPIInstanceFT::getProperty>(instance, name) : Read{};
 }
 
 /** @param value null sets the property to null */
@@ -63,44 +66,44 @@ CMPIDateTime* makeDateTime(const CMPIBroker* broker, const std::string& text) {
     return cim::make<&CMPIBrokerEncFT::newDateTimeFromChars>(broker, text.c_str());
 }
 
-bool isPresent(const CMPIData& data, const CMPIStatus& status, CMPIType type) {
-    return status.rc == CMPI_RC_OK && cim::hasValue(data) && data.type == type;
+bool isPresent(const Read& read, CMPIType type) {
+    return read.isOk() && cim::hasValue(read.value) && read.value.type == type;
 }
 
 /** @name Values read from a broker
  * None when the reading failed, the value is null, or it is of another type.
  */
 ///@{
-std::optional<std::string> stringOf(const CMPIData& data, const CMPIStatus& status) {
-    const bool isString = isPresent(data, status, CMPI_string) || isPresent(data, status, CMPI_chars);
-    return isString ? cim::charactersOf(data) : std::nullopt;
+std::optional<std::string> stringOf(const Read& read) {
+    const bool isString = isPresent(read, CMPI_string) || isPresent(read, CMPI_chars);
+    return isString ? cim::charactersOf(read.value) : std::nullopt;
 }
 
-std::optional<std::string> dateTimeOf(const CMPIData& data, const CMPIStatus& status) {
-    return isPresent(data, status, CMPI_dateTime) ? cim::charactersOf(data) : std::nullopt;
+std::optional<std::string> dateTimeOf(const Read& read) {
+    return isPresent(read, CMPI_dateTime) ? cim::charactersOf(read.value) : std::nullopt;
 }
 
-std::optional<unsigned int> numberOf(const CMPIData& data, const CMPIStatus& status) {
-    const auto digits = isPresent(data, status, data.type) ? cim::digitsOf(data) : std::nullopt;
+std::optional<unsigned int> numberOf(const Read& read) {
+    const auto digits = isPresent(read, read.value.type) ? cim::digitsOf(read.value) : std::nullopt;
     unsigned int number = 0;
     const bool fits =
         digits && std::from_chars(digits->data(), digits->data() + digits->size(), number).ec == std::errc();
     return fits ? std::optional<unsigned int>(number) : std::nullopt;
 }
 
-std::optional<bool> flagOf(const CMPIData& data, const CMPIStatus& status) {
-    return isPresent(data, status, CMPI_boolean) ? std::optional<bool>(data.value.boolean != 0) : std::nullopt;
+std::optional<bool> flagOf(const Read& read) {
+    return isPresent(read, CMPI_boolean) ? std::optional<bool>(read.value.value.boolean != 0) : std::nullopt;
 }
 
 /** A string, an integer in decimal digits, or a boolean as "true" or "false". */
-std::optional<std::string> keyOf(const CMPIData& data, const CMPIStatus& status) {
-    const bool isKeyType = data.type != CMPI_dateTime && isPresent(data, status, data.type);
-    return isKeyType ? cim::charactersOf(data) : std::nullopt;
+std::optional<std::string> keyOf(const Read& read) {
+    const bool isKeyType = read.value.type != CMPI_dateTime && isPresent(read, read.value.type);
+    return isKeyType ? cim::charactersOf(read.value) : std::nullopt;
 }
 
 /** A reference; null for none. It belongs to the broker. */
-CMPIObjectPath* referenceOf(const CMPIData& data, const CMPIStatus& status) {
-    return isPresent(data, status, CMPI_ref) ? data.value.ref : nullptr;
+CMPIObjectPath* referenceOf(const Read& read) {
+    return isPresent(read, CMPI_ref) ? read.value.value.ref : nullptr;
 }
 ///@}
 
@@ -135,13 +138,11 @@ unsigned short ProviderUtilities::getKeyCount(const CMPIObjectPath* path) {
 }
 
 bool ProviderUtilities::getKeyProperty(const CMPIObjectPath* path, const char* name, std::string& value) {
-    const auto [data, status] = getKey(path, name);
-    return deliver(stringOf(data, status), value);
+    return deliver(stringOf(getKey(path, name)), value);
 }
 
 bool ProviderUtilities::getKeyProperty(const CMPIObjectPath* path, const char* name, CMPIObjectPath** value) {
-    const auto [data, status] = getKey(path, name);
-    CMPIObjectPath* reference = referenceOf(data, status);
+    CMPIObjectPath* reference = referenceOf(getKey(path, name));
     if (reference == nullptr || value == nullptr) {
         return false;
     }
@@ -216,27 +217,25 @@ void ProviderUtilities::setProperty(const CMPIBroker* broker, CMPIInstance* inst
 
 bool ProviderUtilities::getProperty(const CMPIInstance* instance, const char* name, std::string& value,
                                     bool /*isDateTime*/) {
-    const auto [data, status] = getPropertyData(instance, name);
-    return deliver(dateTimeOf(data, status), value) || deliver(stringOf(data, status), value);
+    const Read read = getPropertyData(instance, name);
+    return deliver(dateTimeOf(read), value) || deliver(stringOf(read), value);
 }
 
 bool ProviderUtilities::getProperty(const CMPIInstance* instance, const char* name, unsigned int& value) {
-    const auto [data, status] = getPropertyData(instance, name);
-    return deliver(numberOf(data, status), value);
+    return deliver(numberOf(getPropertyData(instance, name)), value);
 }
 
 bool ProviderUtilities::getProperty(const CMPIInstance* instance, const char* name, bool& value) {
-    const auto [data, status] = getPropertyData(instance, name);
-    return deliver(flagOf(data, status), value);
+    return deliver(flagOf(getPropertyData(instance, name)), value);
 }
 
 void ProviderUtilities::transformObjectPathToMoniker(const CMPIObjectPath* path, Moniker& moniker) {
     const CMPICount count = cim::ask<&CMPIObjectPathFT::getKeyCount>(path).value;
     for (CMPICount index = 0; index < count; ++index) {
         CMPIString* nameString = nullptr;
-        const auto key = cim::ask<&CMPIObjectPathFT::getKeyAt>(path, index, &nameString);
+        const Read key = cim::ask<&CMPIObjectPathFT::getKeyAt>(path, index, &nameString);
         const std::optional<std::string> name = cim::charactersOf(nameString);
-        const std::optional<std::string> value = keyOf(key.value, key.status);
+        const std::optional<std::string> value = keyOf(key);
         if (name && value) {
             moniker.addKey(*name, *value);
         }

@@ -1,12 +1,60 @@
 #pragma once
 
+#include <algorithm>
+#include <array>
 #include <cstddef>
 #include <string>
+#include <string_view>
 
 #include "configuration/Document.h"
-#include "logging/Levels.h"
+#include "logging/Record.h"
 
 namespace RZLog {
+
+/** The highest level that each channel writes. */
+struct ChannelLevels {
+    int log = 3000;
+    int trace = 3000;
+
+    int of(Channel channel) const { return channel == Channel::log ? log : trace; }
+    int highest() const { return std::max(log, trace); }
+};
+
+/**
+ * The levels of the loggers. Reading them allocates nothing, takes no lock and works until the library is unloaded,
+ * also after static objects are destroyed: hence the fixed sizes.
+ */
+class Levels {
+public:
+    static constexpr std::size_t mostLoggers = 64;
+    static constexpr std::size_t longestName = 127;
+
+    /** Sets the levels of all other loggers. */
+    void setDefault(ChannelLevels levels) { fallback = levels; }
+
+    /** Sets one logger's levels. @return false if there is no room or the name is too long */
+    bool set(std::string_view logger, ChannelLevels levels);
+
+    /** The levels of a logger. */
+    const ChannelLevels& of(std::string_view logger) const;
+
+    /** The highest level that any channel of any logger writes. */
+    int highest() const;
+
+    /** Whether to write a record of that level. */
+    bool admit(Channel channel, std::string_view logger, int level) const { return level <= of(logger).of(channel); }
+
+private:
+    struct Entry {
+        std::array<char, longestName + 1> name;
+        std::size_t length;
+        ChannelLevels levels;
+    };
+
+    ChannelLevels fallback;
+    std::array<Entry, mostLoggers> entries{};
+    std::size_t count = 0;
+};
 
 /** The [log] table of the agent's configuration. */
 struct LogSettings {

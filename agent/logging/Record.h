@@ -4,8 +4,6 @@
 #include <string>
 #include <string_view>
 
-#include "logging/Levels.h"
-
 namespace RZLog {
 
 /** The logger of the agent's libraries. */
@@ -13,6 +11,9 @@ constexpr const char* ownLogger = "Ostrel.Agent";
 
 /** The level of errors. */
 constexpr int errorLevel = 3000;
+
+/** The two channels of the log. */
+enum class Channel { log, trace };
 
 /** One record. Does not own its strings. */
 struct Record {

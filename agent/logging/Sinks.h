@@ -4,7 +4,6 @@
 #include <string>
 
 #include "logging/LogSettings.h"
-#include "logging/Record.h"
 
 namespace RZLog {
 

@@ -1,13 +1,16 @@
-#include "logging/Writer.h"
+#include <pthread.h>
 
 #include <atomic>
+#include <cerrno>
 #include <chrono>
 #include <limits>
 #include <mutex>
 #include <type_traits>
 
-#include "logging/LogSettings.h"
+#include "RZLog/RZLogger.h"
 #include "logging/Sinks.h"
+
+// The functions of RZLogger: writes records to the destination of the configuration.
 
 namespace RZLog {
 
@@ -15,7 +18,8 @@ namespace {
 
 constexpr std::chrono::seconds pauseAfterFailure{10};
 
-std::atomic<int> ceiling{std::numeric_limits<int>::max()};
+/** The highest level that levelsOf() returns for any logger; the maximum until the configuration is read. */
+std::atomic<int> highestLevel{std::numeric_limits<int>::max()};
 
 /** The destination and its settings. */
 struct Output {
@@ -71,6 +75,17 @@ void writeUnlessFailing(const Record& record) noexcept {
     }
 }
 
+/**
+ * Writes a record to the configured destination. If that fails, drops the record and reopens the destination some
+ * seconds later. Drops records after the library's static objects are destroyed.
+ */
+void write(const Record& record) noexcept {
+    const std::lock_guard<std::mutex> lock(outputMutex);
+    if (output != nullptr) {
+        writeUnlessFailing(record);
+    }
+}
+
 void reportProblems(const Agent::Problems& problems, const Levels& levels) {
     for (const std::string& problem : problems) {
         for (const Channel channel : {Channel::log, Channel::trace}) {
@@ -104,27 +119,84 @@ Levels configure() {
         output = newOutput.release();
     }
     reportProblems(problems, levels);
-    ceiling = levels.highest();
+    highestLevel = levels.highest();
     return levels;
 }
 
-}  // namespace
-
+/**
+ * The highest levels that the channels write for a logger. The first call in the process reads the configuration. If it
+ * has no destination, nothing is written.
+ */
 const ChannelLevels& levelsOf(std::string_view logger) {
     static_assert(std::is_trivially_destructible_v<Levels>, "levels are read while static objects are destroyed");
     static const Levels levels = configure();
     return levels.of(logger);
 }
 
-int highestLevel() noexcept {
-    return ceiling.load(std::memory_order_relaxed);
+std::string_view orEmpty(const char* text) {
+    return text != nullptr ? text : "";
 }
 
-void write(const Record& record) noexcept {
-    const std::lock_guard<std::mutex> lock(outputMutex);
-    if (output != nullptr) {
-        writeUnlessFailing(record);
+/**
+ * Keeps errno for the caller, and disables the cancellation of the thread while a record is written: cancellation
+ * unwinds the stack with an exception, which no catch may swallow.
+ */
+class PreserveErrno {
+public:
+    PreserveErrno() : error(errno) { ::pthread_setcancelstate(PTHREAD_CANCEL_DISABLE, &cancelling); }
+    ~PreserveErrno() {
+        ::pthread_setcancelstate(cancelling, nullptr);
+        errno = error;
     }
+    PreserveErrno(const PreserveErrno&) = delete;
+    PreserveErrno& operator=(const PreserveErrno&) = delete;
+
+private:
+    int error;
+    int cancelling = PTHREAD_CANCEL_ENABLE;
+};
+
+void writeIfAdmitted(const Record& record) noexcept {
+    if (record.level > highestLevel.load(std::memory_order_relaxed)) {
+        return;
+    }
+    const PreserveErrno preserveErrno;
+    try {
+        if (record.level <= levelsOf(record.logger).of(record.channel)) {
+            write(record);
+        }
+    } catch (...) {  // out of memory while reading the configuration: the next call tries again
+    }
+}
+
+/**
+ * Whether a channel admits records of this level; true if that cannot be determined. Not inline, so that the usual
+ * case, which does not come here, is cheap.
+ */
+[[gnu::noinline]] bool mayAdmit(const std::string& logger, int level) noexcept {
+    const PreserveErrno preserveErrno;
+    try {
+        return level <= levelsOf(logger).highest();
+    } catch (...) {
+        return true;
+    }
+}
+
+}  // namespace
+
+void RZLogger::logLevelMessage(const char* function, const char* file, int line, const std::string& logger, int level,
+                               char* /*extra*/, int, int, const std::string& text) {
+    writeIfAdmitted({Channel::log, level, logger, orEmpty(function), orEmpty(file), line, text});
+}
+
+void RZLogger::traceLevelMessage(const char* function, const char* file, int line, const std::string& logger, int level,
+                                 char* /*extra*/, int, int, const std::string& text) {
+    writeIfAdmitted({Channel::trace, level, logger, orEmpty(function), orEmpty(file), line, text});
+}
+
+bool RZLogger::admits(const std::string& logger, int level) noexcept {
+    // Most records end at the first comparison.
+    return level <= highestLevel.load(std::memory_order_relaxed) && mayAdmit(logger, level);
 }
 
 }  // namespace RZLog

@@ -5,6 +5,7 @@
 
 #include "Installation.h"
 #include "cli/Choice.h"
+#include "cli/Commands.h"
 #include "cli/Suggestion.h"
 
 namespace cimhost {
@@ -183,7 +184,7 @@ void end(ParsedArguments& parsed, const CLI::App& app, const CLI::ParseError& er
 
 }  // namespace
 
-ParsedArguments parseArguments(int count, const char* const* values, const CommandLineExtension& extension) {
+ParsedArguments parseArguments(int count, const char* const* values, CommandExtension& extension) {
     ParsedArguments parsed;
     CLI::App app(extension.introduction.empty() ? introduction : extension.introduction, extension.program);
     app.footer(examples + extension.examples + (extension.notes.empty() ? "" : "\n" + extension.notes) + closing);
@@ -193,9 +194,7 @@ ParsedArguments parseArguments(int count, const char* const* values, const Comma
     for (const Command& command : commands) {
         addCommand(app, command, parsed.arguments);
     }
-    if (extension.addTo) {
-        extension.addTo(app);
-    }
+    extension.addTo(app);
     try {
         app.parse(count, values);
     } catch (const CLI::ParseError& error) {

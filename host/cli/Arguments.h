@@ -1,6 +1,5 @@
 #pragma once
 
-#include <functional>
 #include <optional>
 #include <stdexcept>
 #include <string>
@@ -9,11 +8,9 @@
 #include "cli/TextLayout.h"
 #include "model/Request.h"
 
-namespace CLI {
-class App;
-}
-
 namespace cimhost {
+
+class CommandExtension;
 
 /** Exit statuses of the program. */
 enum ExitStatus {
@@ -31,15 +28,6 @@ public:
 };
 
 enum class Format { text, json, mof };
-
-/** Additions of a program to the command line of cimhost. */
-struct CommandLineExtension {
-    std::string program = "cimhost";
-    std::string introduction{};              ///< first paragraph of the help; empty: that of cimhost
-    std::string examples{};                  ///< more lines of examples, each with a line feed
-    std::string notes{};                     ///< a paragraph after the examples, with a line feed; empty: none
-    std::function<void(CLI::App&)> addTo{};  ///< adds options and commands; may be empty
-};
 
 /** The options and arguments of a command line. */
 struct Arguments {
@@ -69,6 +57,6 @@ struct ParsedArguments {
     std::string error{};   ///< for standard error, if ended
 };
 
-ParsedArguments parseArguments(int count, const char* const* values, const CommandLineExtension& extension);
+ParsedArguments parseArguments(int count, const char* const* values, CommandExtension& extension);
 
 }  // namespace cimhost

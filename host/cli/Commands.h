@@ -8,6 +8,10 @@
 #include "operations/ObjectManager.h"
 #include "schema/Schema.h"
 
+namespace CLI {
+class App;
+}
+
 namespace cimhost {
 
 /** The result of a command. */
@@ -18,10 +22,18 @@ struct CommandResult {
     std::string hint{};     ///< advice after a failed request; empty: none
 };
 
-/** Additions of a program to the commands of cimhost. */
+/** Additions of a program to the command line and the commands of cimhost. */
 class CommandExtension {
 public:
     virtual ~CommandExtension() = default;
+
+    std::string program = "cimhost";
+    std::string introduction{};  ///< first paragraph of the help; empty: that of cimhost
+    std::string examples{};      ///< more lines of examples, each with a line feed
+    std::string notes{};         ///< a paragraph after the examples, with a line feed; empty: none
+
+    /** Adds options and commands to the command line. They are stored in this object. */
+    virtual void addTo(CLI::App&) {}
 
     /** Null: the standard behaviour. */
     virtual std::shared_ptr<const ManagerBehaviour> behaviour() const { return nullptr; }
@@ -42,5 +54,8 @@ public:
  * @throws LoadError, LibraryError for files that cannot be loaded
  */
 CommandResult runCommand(const Arguments& arguments, CommandExtension& extension);
+
+/** Runs cimhost with these additions. @return the exit status */
+int runProgram(int count, const char* const* values, CommandExtension& extension);
 
 }  // namespace cimhost

@@ -1,5 +1,3 @@
-#include "cli/Program.h"
-
 #include <unistd.h>
 
 #include <cerrno>
@@ -8,6 +6,7 @@
 #include <cstring>
 #include <string>
 
+#include "cli/Commands.h"
 #include "operations/StatusText.h"
 #include "schema/Errors.h"
 
@@ -39,8 +38,8 @@ private:
     text::Style style;  ///< of standard error
 };
 
-int run(const Arguments& arguments, CommandExtension& commands, const Console& console) {
-    const CommandResult result = runCommand(arguments, commands);
+int run(const Arguments& arguments, CommandExtension& extension, const Console& console) {
+    const CommandResult result = runCommand(arguments, extension);
     if (!console.write(result.output)) {
         return exitOutput;
     }
@@ -58,9 +57,9 @@ int run(const Arguments& arguments, CommandExtension& commands, const Console& c
     return exitSuccess;
 }
 
-int runGuarded(const Arguments& arguments, CommandExtension& commands, const Console& console) {
+int runGuarded(const Arguments& arguments, CommandExtension& extension, const Console& console) {
     try {
-        return run(arguments, commands, console);
+        return run(arguments, extension, console);
     } catch (const LoadError& error) {
         console.printError(error.what());
         return exitLoad;
@@ -86,14 +85,13 @@ int runGuarded(const Arguments& arguments, CommandExtension& commands, const Con
 
 }  // namespace
 
-int runProgram(int count, const char* const* values, const CommandLineExtension& commandLine,
-               CommandExtension& commands) {
+int runProgram(int count, const char* const* values, CommandExtension& extension) {
     std::signal(SIGPIPE, SIG_IGN);  // report a closed pipe as an error
-    ParsedArguments parsed = parseArguments(count, values, commandLine);
-    const Console console(commandLine.program, text::styleFor(STDERR_FILENO, parsed.arguments.colours));
+    ParsedArguments parsed = parseArguments(count, values, extension);
+    const Console console(extension.program, text::styleFor(STDERR_FILENO, parsed.arguments.colours));
     parsed.arguments.style = text::styleFor(STDOUT_FILENO, parsed.arguments.colours);
     if (!parsed.ended) {
-        return runGuarded(parsed.arguments, commands, console);
+        return runGuarded(parsed.arguments, extension, console);
     }
     if (!parsed.error.empty()) {
         console.printError(parsed.error);

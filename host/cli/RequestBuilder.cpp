@@ -6,7 +6,6 @@
 #include "schema/Literal.h"
 #include "schema/MofWriter.h"
 #include "schema/ObjectPathText.h"
-#include "schema/PropertyValue.h"
 
 namespace cimhost {
 namespace {

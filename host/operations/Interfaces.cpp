@@ -1,5 +1,7 @@
 #include "operations/Interfaces.h"
 
+#include <type_traits>
+
 namespace cimhost {
 namespace {
 
@@ -13,7 +15,8 @@ using GenericFactory = Interface*(const CMPIBroker*, const CMPIContext*, const c
 template <class Interface>
 Interface* callFactory(const LoadedLibrary& library, const std::string& provider, FactoryChoice choice,
                        const CMPIBroker* broker, const CMPIContext* context, CMPIStatus* rc) {
-    const std::string suffix = std::string("_Create_") + nameOf(InterfaceTraits<Interface>::kind) + "MI";
+    const bool isInstance = std::is_same_v<Interface, CMPIInstanceMI>;
+    const std::string suffix = isInstance ? "_Create_InstanceMI" : "_Create_AssociationMI";
     auto* named = library.function<NamedFactory<Interface>>(provider + suffix);
     auto* generic = library.function<GenericFactory<Interface>>("_Generic" + suffix);
     if (named != nullptr && generic != nullptr && choice == FactoryChoice::neither) {
@@ -34,10 +37,6 @@ Interface* callFactory(const LoadedLibrary& library, const std::string& provider
 }
 
 }  // namespace
-
-const char* nameOf(InterfaceKind kind) {
-    return kind == InterfaceKind::instance ? "Instance" : "Association";
-}
 
 template <class Interface>
 Interface* createInterface(const LoadedLibrary& library, const std::string& provider, Broker& broker,

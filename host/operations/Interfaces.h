@@ -50,22 +50,6 @@ ProviderCall callProvider(Call&& call) {
 /** The kinds of management interfaces that this host calls. */
 enum class InterfaceKind { instance, association };
 
-/** "Instance" or "Association", as in the names of factories. */
-const char* nameOf(InterfaceKind kind);
-
-template <class Interface>
-struct InterfaceTraits;
-
-template <>
-struct InterfaceTraits<CMPIInstanceMI> {
-    static constexpr InterfaceKind kind = InterfaceKind::instance;
-};
-
-template <>
-struct InterfaceTraits<CMPIAssociationMI> {
-    static constexpr InterfaceKind kind = InterfaceKind::association;
-};
-
 /**
  * Calls the factory of a provider, <name>_Create_<kind>MI or _Generic_Create_<kind>MI. CMPI objects that the factory
  * creates are released after the call.

@@ -2,7 +2,6 @@
 
 #include <iterator>
 #include <mutex>
-#include <tuple>
 #include <type_traits>
 #include <utility>
 #include <vector>
@@ -44,11 +43,6 @@ ProviderPool::InUse::~InUse() {
     if (--pool.uses == 0) {
         pool.unloadCrashed();
     }
-}
-
-bool ProviderPool::AddressLess::operator()(const ProviderAddress& left, const ProviderAddress& right) const {
-    return std::tie(left.location, left.provider, left.forClass) <
-           std::tie(right.location, right.provider, right.forClass);
 }
 
 template <class Interface>

@@ -72,11 +72,6 @@ private:
         ChainMutex mutex{};       ///< held while a factory runs, if factories may run concurrently
     };
 
-    /** An order of addresses, for use as keys. */
-    struct AddressLess {
-        bool operator()(const ProviderAddress& left, const ProviderAddress& right) const;
-    };
-
     template <class Interface>
     static Interface*& member(Provider& provider);
 
@@ -105,7 +100,7 @@ private:
     ProviderPolicy policy;
     ChainMutex mutex;  ///< held while a factory runs, which may send a request to another provider
     Libraries libraries;
-    std::map<ProviderAddress, Provider, AddressLess> providers;
+    std::map<ProviderAddress, Provider> providers;
     std::atomic<std::size_t> uses{0};
     std::mutex crashedMutex{};
     std::set<std::string> crashed;  ///< locations of the libraries to unload

@@ -2,6 +2,7 @@
 
 #include <string>
 #include <string_view>
+#include <tuple>
 #include <vector>
 
 #include "operations/Interfaces.h"
@@ -14,6 +15,10 @@ struct ProviderAddress {
     std::string location{};  ///< see findLibrary()
     std::string provider{};  ///< prefix of its factories
     std::string forClass{};  ///< the class that it is created for; empty: all classes that it serves
+
+    bool operator<(const ProviderAddress& other) const {
+        return std::tie(location, provider, forClass) < std::tie(other.location, other.provider, other.forClass);
+    }
 };
 
 /** A class that a provider serves in a namespace. */

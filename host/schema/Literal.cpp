@@ -6,10 +6,16 @@
 
 #include "cim/DateTime.h"
 #include "schema/Errors.h"
+#include "schema/MofReader.h"
+#include "schema/ObjectPathGrammar.h"
 #include "schema/ObjectPathText.h"
+#include "schema/StringLiteral.h"
 
 namespace cimhost {
 namespace {
+
+namespace path = grammar::path;
+namespace peg = tao::pegtl;
 
 [[noreturn]] void refuse(const Literal& literal, CMPIType type, const std::string& remedy) {
     throw ValueError(literal.source + " is not a " + std::string(typeName(type)) + ": " + remedy);
@@ -159,6 +165,62 @@ Scalar typedElement(const Literal& literal, const Property& property, const Sche
 
 CMPIType literalType(const Literal& literal) {
     return std::visit(LiteralKind{}, literal.value);
+}
+
+namespace {
+
+/** The literal of a value without quotation marks. */
+Literal plainLiteral(std::string_view source, const Property& property) {
+    if (property.type == CMPI_char16) {
+        if (const std::optional<std::uint16_t> code = singleCharacter(source)) {
+            return {Char16{*code}, std::string(source)};
+        }
+    }
+    return {std::string(source), std::string(source)};
+}
+
+bool isPlain(CMPIType type, std::string_view source) {
+    return type == CMPI_string || type == CMPI_dateTime || type == CMPI_ref ||
+           (type == CMPI_char16 && (source.empty() || source.front() != '\'' || source.size() == 1));
+}
+
+Literal readLiteral(std::string_view source) {
+    peg::memory_input<> input(source.data(), source.size(), "");
+    const auto root = peg::parse_tree::parse<path::LoneConstant, grammar::Node, path::Selected>(input);
+    if (root == nullptr) {
+        return {std::string(source), source.empty() ? "an empty string" : std::string(source)};
+    }
+    return grammar::readLiteral(*root->children.front());
+}
+
+Value parseValue(std::string_view source, const Property& property, const Schema& schema,
+                 const std::string& defaultNameSpace) {
+    if (property.isArray) {
+        Value list = Value::array(property.type, {});
+        for (const Literal& literal : readMofArray(source)) {
+            list.items.push_back(typedElement(literal, property, schema, defaultNameSpace));
+        }
+        return list;
+    }
+    const Literal literal = isPlain(property.type, source) ? plainLiteral(source, property) : readLiteral(source);
+    const Scalar element = typedElement(literal, property, schema, defaultNameSpace);
+    if (std::holds_alternative<std::monostate>(element)) {
+        throw ValueError("null is not a " + std::string(typeName(property.type)));
+    }
+    return Value::of(property.type, element);
+}
+
+}  // namespace
+
+Value parsePropertyValue(std::string_view source, const Property& property, const Schema& schema,
+                         const std::string& defaultNameSpace) {
+    try {
+        return parseValue(source, property, schema, defaultNameSpace);
+    } catch (const ValueError& error) {
+        throw ValueError(property.name + ": " + error.what());
+    } catch (const PathError& error) {
+        throw PathError(property.name + ": " + error.what());
+    }
 }
 
 }  // namespace cimhost

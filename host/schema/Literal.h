@@ -2,6 +2,7 @@
 
 #include <cstdint>
 #include <string>
+#include <string_view>
 #include <variant>
 
 #include "model/Value.h"
@@ -39,5 +40,14 @@ Scalar typedElement(const Literal& literal, const Property& property, const Sche
 
 /** The type of a literal that no class declares: string, boolean, uint64 or (negative) sint64, real64, char16. */
 CMPIType literalType(const Literal& literal);
+
+/**
+ * Reads a property value from a command line: without quotation marks for strings, datetimes, references and char16; as
+ * a literal for other types; as a list in braces, {"a", "b"}, for arrays. Nothing is the empty string and not valid for
+ * other types; null cannot be written.
+ * @throws ValueError, PathError with the property's name
+ */
+Value parsePropertyValue(std::string_view source, const Property& property, const Schema& schema,
+                         const std::string& defaultNameSpace);
 
 }  // namespace cimhost

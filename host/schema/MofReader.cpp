@@ -1,19 +1,337 @@
 #include "schema/MofReader.h"
 
 #include <fstream>
+#include <functional>
+#include <map>
 #include <sstream>
 #include <stdexcept>
 #include <system_error>
 
+#include "cim/Names.h"
 #include "schema/Errors.h"
-#include "schema/MofBuilder.h"
-#include "schema/MofMessages.h"
+#include "schema/MofGrammar.h"
+#include "schema/StringLiteral.h"
 
 namespace cimhost {
 namespace {
 
 namespace mof = grammar::mof;
 namespace peg = tao::pegtl;
+using cim::findNamed;
+using grammar::children;
+using grammar::findChild;
+using grammar::Node;
+
+[[noreturn]] void fail(const peg::position& position, const std::string& message) {
+    throw LoadError(position.source + ":" + std::to_string(position.line) + ":" + std::to_string(position.column) +
+                    ": " + message);
+}
+
+[[noreturn]] void fail(const Node& node, const std::string& message) {
+    fail(node.begin(), message);
+}
+
+/** Runs the action. Rethrows its errors as LoadError with the position of the node. */
+template <typename Action>
+auto at(const Node& node, Action action) {
+    try {
+        return action();
+    } catch (const LoadError&) {
+        throw;
+    } catch (const std::runtime_error& error) {
+        fail(node, error.what());
+    } catch (const std::invalid_argument& error) {
+        fail(node, error.what());
+    }
+}
+
+CMPIType readType(const Node& node) {
+    const std::optional<CMPIType> type = intrinsicType(node.string_view());
+    if (!type) {
+        fail(node, node.string() +
+                       " is not a data type: expected boolean, string, datetime, char16, uint8 to uint64, "
+                       "sint8 to sint64, real32, real64, or a class name followed by REF");
+    }
+    return *type;
+}
+
+Scope readScope(const Node& clause) {
+    Scope scope;
+    for (const Node* element : children<mof::MetaElement>(clause)) {
+        for (std::size_t i = 0; i < scope.size(); ++i) {
+            const bool isNamed = cim::sameName(element->string_view(), scopeNames[i]);
+            scope[i] = scope[i] || isNamed || cim::sameName(element->string_view(), "any");
+        }
+    }
+    return scope;
+}
+
+void applyFlavor(Flavor& flavor, const Node& node) {
+    struct Row {
+        const char* name;
+        bool Flavor::*member;
+        bool value;
+    };
+    constexpr Row rows[] = {
+        {"EnableOverride", &Flavor::overridable, true}, {"DisableOverride", &Flavor::overridable, false},
+        {"ToSubclass", &Flavor::toSubclass, true},      {"ToInstance", &Flavor::toSubclass, true},
+        {"Restricted", &Flavor::toSubclass, false},     {"Translatable", &Flavor::translatable, true}};
+    if (const Row* row = findNamed(rows, node.string_view())) {
+        flavor.*row->member = row->value;
+        return;
+    }
+    fail(node, node.string() +
+                   " is not a flavor: expected EnableOverride, DisableOverride, ToSubclass, Restricted or "
+                   "Translatable");
+}
+
+/** The array initializer or constant of a node. */
+const Node* initializerOf(const Node& node) {
+    const Node* array = findChild<mof::ArrayInitializer>(node);
+    return array != nullptr ? array : findChild<mof::Constant>(node);
+}
+
+/** Adds the default values of the class to an instance, and the keys to its path. */
+void complete(Instance& instance, const Class& declared, const Node& node) {
+    for (const Property& property : declared.properties) {
+        if (!property.defaultValue.isNull && findNamed(instance.properties, property.name) == nullptr) {
+            instance.properties.push_back({property.name, property.defaultValue});
+        }
+    }
+    for (const Property* key : declared.keys()) {
+        const NamedValue* value = findNamed(instance.properties, key->name);
+        if (value == nullptr || value->value.isNull) {
+            fail(node, "the key " + key->name + " has no value");
+        }
+        instance.path.keys.push_back(*value);
+    }
+}
+
+/** The literal of a MOF constant. Adjacent strings are joined. An alias results in NULL. */
+Literal constantLiteral(const Node& constant) {
+    const std::vector<const Node*> parts = children<mof::StringPart>(constant);
+    if (!parts.empty()) {
+        std::string value;
+        for (const Node* part : parts) {
+            value += unescaped(part->string_view());
+        }
+        std::string source = inQuotes(value);
+        return {std::move(value), std::move(source)};
+    }
+    return grammar::readLiteral(*constant.children.front());
+}
+
+/** Adds the classes, qualifier declarations and instances of a parse tree to a schema. */
+class MofBuilder {
+public:
+    /** @param onInclude called for each #pragma include, in order */
+    MofBuilder(Schema& target, std::function<void(const std::string& file)> onInclude)
+        : schema(target), include(std::move(onInclude)) {}
+
+    /** @throws LoadError with file, line and column of the first error */
+    void build(const Node& root) {
+        for (const auto& child : root.children) {
+            buildDeclaration(*child);
+        }
+    }
+
+private:
+    void buildDeclaration(const Node& node) {
+        const Node* declaration = &node;
+        const Node* qualifiers = nullptr;
+        if (node.is_type<mof::QualifiedDeclaration>()) {
+            qualifiers = node.children.front().get();
+            declaration = node.children.back().get();
+        }
+        if (declaration->is_type<mof::Pragma>()) {
+            buildPragma(*declaration);
+        } else if (declaration->is_type<mof::QualifierDeclaration>()) {
+            buildQualifierDeclaration(*declaration);
+        } else if (declaration->is_type<mof::ClassDeclaration>()) {
+            buildClass(*declaration, qualifiers);
+        } else {
+            buildInstance(*declaration);
+        }
+    }
+
+    void buildPragma(const Node& pragma) {
+        if (cim::sameName(findChild<mof::PragmaName>(pragma)->string_view(), "include")) {
+            at(pragma, [&] { include(std::get<std::string>(constantLiteral(pragma).value)); });
+        }
+    }
+
+    void buildQualifierDeclaration(const Node& node) {
+        QualifierDeclaration declaration;
+        declaration.name = findChild<mof::QualifierName>(node)->string();
+        declaration.type = readType(*findChild<mof::DataType>(node));
+        declaration.isArray = findChild<mof::ArrayMark>(node) != nullptr;
+        declaration.defaultValue = Value::null(declaration.type, declaration.isArray);
+        if (const Node* value = findChild<mof::DefaultValue>(node)) {
+            const Property type{declaration.name, declaration.type, declaration.isArray};
+            declaration.defaultValue = readValue(*initializerOf(*value), type);
+        }
+        declaration.scope = readScope(*findChild<mof::ScopeClause>(node));
+        if (const Node* clause = findChild<mof::FlavorClause>(node)) {
+            for (const Node* flavor : children<mof::FlavorName>(*clause)) {
+                applyFlavor(declaration.flavor, *flavor);
+            }
+        }
+        at(node, [&] { schema.add(std::move(declaration)); });
+    }
+
+    void buildClass(const Node& node, const Node* qualifiers) {
+        Class declared;
+        declared.name = findChild<mof::ClassName>(node)->string();
+        if (const Node* super = findChild<mof::SuperclassName>(node)) {
+            declared.superclass = super->string();
+        }
+        declared.qualifiers = readQualifiers(qualifiers);
+        for (const Node* feature : children<mof::Feature>(node)) {
+            buildFeature(declared, *feature);
+        }
+        at(node, [&] { schema.add(std::move(declared)); });
+    }
+
+    void buildFeature(Class& declared, const Node& feature) const {
+        const std::string name = findChild<mof::FeatureName>(feature)->string();
+        if (const Node* parameters = findChild<mof::ParameterList>(feature)) {
+            Method method{name};
+            method.type = intrinsicType(findChild<mof::DataType>(feature)->string_view()).value_or(CMPI_null);
+            method.qualifiers = readQualifiers(findChild<mof::QualifierList>(feature));
+            for (const Node* parameter : children<mof::Parameter>(*parameters)) {
+                method.parameters.push_back(
+                    readTypedName(findChild<mof::ParameterName>(*parameter)->string(), *parameter));
+            }
+            declared.methods.push_back(std::move(method));
+            return;
+        }
+        Property property = readTypedName(name, feature);
+        property.defaultValue = Value::null(property.type, property.isArray);
+        if (const Node* value = findChild<mof::DefaultValue>(feature)) {
+            property.defaultValue = readValue(*initializerOf(*value), property);
+        }
+        declared.properties.push_back(std::move(property));
+    }
+
+    /** Name, type and qualifiers of a property or a parameter. */
+    Property readTypedName(const std::string& name, const Node& node) const {
+        Property property{name};
+        const Node& type = *findChild<mof::DataType>(node);
+        if (findChild<mof::ReferenceMark>(node) != nullptr) {
+            property.type = CMPI_ref;
+            property.referenceClass = type.string();
+        } else {
+            property.type = readType(type);
+        }
+        property.isArray = findChild<mof::ArrayMark>(node) != nullptr;
+        property.qualifiers = readQualifiers(findChild<mof::QualifierList>(node));
+        return property;
+    }
+
+    std::vector<Qualifier> readQualifiers(const Node* list) const {
+        std::vector<Qualifier> qualifiers;
+        if (list == nullptr) {
+            return qualifiers;
+        }
+        for (const Node* node : children<mof::Qualifier>(*list)) {
+            Qualifier qualifier = readQualifier(*node);
+            if (findNamed(qualifiers, qualifier.name) != nullptr) {
+                fail(*node, "qualifier " + qualifier.name + " is given twice");
+            }
+            qualifiers.push_back(std::move(qualifier));
+        }
+        return qualifiers;
+    }
+
+    Qualifier readQualifier(const Node& node) const {
+        const std::string name = findChild<mof::QualifierName>(node)->string();
+        const QualifierDeclaration* declaration = schema.findQualifier(name);
+        if (declaration == nullptr) {
+            fail(node, "qualifier " + name + " is not declared; declare it (Qualifier " + name +
+                           " : TYPE, Scope(...);) or include the file that does");
+        }
+        Qualifier qualifier{declaration->name, declaration->defaultValue, declaration->flavor};
+        if (const Node* initializer = initializerOf(node)) {
+            qualifier.value = readValue(*initializer, {name, declaration->type, declaration->isArray});
+        } else if (declaration->type == CMPI_boolean && !declaration->isArray) {
+            qualifier.value = Value::of(CMPI_boolean, true);
+        }
+        for (const Node* flavor : children<mof::FlavorName>(node)) {
+            applyFlavor(qualifier.flavor, *flavor);
+        }
+        return qualifier;
+    }
+
+    Value readValue(const Node& initializer, const Property& type) const {
+        if (initializer.is_type<mof::Constant>()) {
+            const Scalar scalar = readElement(initializer, type);
+            const bool isNull = std::holds_alternative<std::monostate>(scalar);
+            if (type.isArray && !isNull) {
+                fail(initializer, type.name + " is an array: expected its values in braces");
+            }
+            Value value = Value::of(type.type, scalar);
+            value.isArray = type.isArray;
+            return value;
+        }
+        if (!type.isArray) {
+            fail(initializer, type.name + " is not an array: expected one value without braces");
+        }
+        Value value = Value::array(type.type, {});
+        for (const Node* constant : children<mof::Constant>(initializer)) {
+            value.items.push_back(readElement(*constant, type));
+        }
+        return value;
+    }
+
+    Scalar readElement(const Node& constant, const Property& type) const {
+        if (const Node* alias = findChild<mof::Alias>(constant)) {
+            const auto known = aliases.find(alias->string_view());
+            if (known == aliases.end()) {
+                fail(*alias, alias->string() + " is not an alias of an instance declared before");
+            }
+            if (type.type != CMPI_ref) {
+                fail(*alias, type.name + " is not a reference, so its value cannot be an alias");
+            }
+            return std::make_shared<const ObjectPath>(known->second);
+        }
+        return at(constant, [&] { return typedElement(constantLiteral(constant), type, schema, ""); });
+    }
+
+    void buildInstance(const Node& node) {
+        const Node& className = *findChild<mof::ClassName>(node);
+        const Class* declared = schema.findClass(className.string_view());
+        if (declared == nullptr) {
+            fail(className, "class " + className.string() + " is not declared; declare or include it first");
+        }
+        Instance instance;
+        instance.path.className = declared->name;
+        for (const Node* assignment : children<mof::Assignment>(node)) {
+            NamedValue property = buildAssignment(*assignment, *declared);
+            if (findNamed(instance.properties, property.name) != nullptr) {
+                fail(*assignment, property.name.string() + " is given twice");
+            }
+            instance.properties.push_back(std::move(property));
+        }
+        complete(instance, *declared, node);
+        if (const Node* clause = findChild<mof::AliasClause>(node)) {
+            aliases.insert_or_assign(findChild<mof::Alias>(*clause)->string(), instance.path);
+        }
+        schema.add(std::move(instance));
+    }
+
+    NamedValue buildAssignment(const Node& assignment, const Class& declared) const {
+        const Node& name = *findChild<mof::AssignedName>(assignment);
+        const Property* property = declared.findProperty(name.string_view());
+        if (property == nullptr) {
+            fail(name, "class " + declared.name + " has no property " + name.string());
+        }
+        return {property->name, readValue(*initializerOf(assignment), *property)};
+    }
+
+    Schema& schema;
+    std::function<void(const std::string& file)> include;
+    std::map<std::string, ObjectPath, cim::NameLess> aliases{};
+};
 
 /** @throws std::invalid_argument if the file does not exist or cannot be read */
 std::string contentOf(const std::filesystem::path& file) {
@@ -30,10 +348,10 @@ std::string contentOf(const std::filesystem::path& file) {
     return content.str();
 }
 
-std::string message(const peg::parse_error& error) {
-    const peg::position& where = error.positions().front();
-    return where.source + ":" + std::to_string(where.line) + ":" + std::to_string(where.column) + ": " +
-           std::string(error.message());
+/** The tree of an input, to which it refers. @tparam Rule of the complete input  @throws tao::pegtl::parse_error */
+template <typename Rule>
+std::unique_ptr<Node> parsed(peg::memory_input<>& input) {
+    return peg::parse_tree::parse<Rule, Node, mof::Selected, peg::nothing, mof::Control>(input);
 }
 
 }  // namespace
@@ -55,16 +373,29 @@ void MofReader::readOnce(const std::filesystem::path& file) {
     readSource(contentOf(file), file.string(), file.parent_path());
 }
 
-void MofReader::readSource(std::string_view mof, const std::string& sourceName,
+void MofReader::readSource(std::string_view source, const std::string& sourceName,
                            const std::filesystem::path& directory) {
     try {
-        peg::memory_input<> input(mof.data(), mof.size(), sourceName);
-        const auto root =
-            peg::parse_tree::parse<mof::File, grammar::Node, mof::Selected, peg::nothing, mof::Control>(input);
-        MofBuilder builder(schema, [&](const std::string& file) { readOnce(directory / file); });
-        builder.build(*root);
+        peg::memory_input<> input(source.data(), source.size(), sourceName);
+        const auto root = parsed<mof::File>(input);
+        MofBuilder(schema, [&](const std::string& file) { readOnce(directory / file); }).build(*root);
     } catch (const peg::parse_error& error) {
-        throw LoadError(message(error));
+        fail(error.positions().front(), std::string(error.message()));
+    }
+}
+
+std::vector<Literal> readMofArray(std::string_view source) {
+    peg::memory_input<> input(source.data(), source.size(), "");
+    try {
+        const auto root = parsed<mof::LoneArray>(input);
+        std::vector<Literal> literals;
+        for (const Node* constant : children<mof::Constant>(*root->children.front())) {
+            literals.push_back(constantLiteral(*constant));
+        }
+        return literals;
+    } catch (const peg::parse_error& error) {
+        throw ValueError("character " + std::to_string(error.positions().front().column) + ": " +
+                         std::string(error.message()));
     }
 }
 

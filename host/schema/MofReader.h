@@ -4,7 +4,9 @@
 #include <set>
 #include <string>
 #include <string_view>
+#include <vector>
 
+#include "schema/Literal.h"
 #include "schema/Schema.h"
 
 namespace cimhost {
@@ -21,7 +23,8 @@ public:
     void readFile(const std::filesystem::path& file);
 
     /** @param sourceName instead of a file name in messages  @param directory of included files */
-    void readSource(std::string_view mof, const std::string& sourceName, const std::filesystem::path& directory = {});
+    void readSource(std::string_view source, const std::string& sourceName,
+                    const std::filesystem::path& directory = {});
 
 private:
     void readOnce(const std::filesystem::path& file);
@@ -29,5 +32,8 @@ private:
     Schema& schema;  ///< not owned
     std::set<std::filesystem::path> filesRead;
 };
+
+/** Reads the values of an array in MOF's form, {1, 2} or {"a", "b"}. @throws ValueError for another source */
+std::vector<Literal> readMofArray(std::string_view source);
 
 }  // namespace cimhost

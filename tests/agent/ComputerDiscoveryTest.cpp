@@ -3,7 +3,7 @@
 #include <filesystem>
 
 #include "agent/TemporaryDirectory.h"
-#include "framework/ComputerDiscovery.h"
+#include "framework/NodeTree.h"
 
 using KO::Node;
 using KO::NodeTree;

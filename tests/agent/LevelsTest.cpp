@@ -2,7 +2,7 @@
 
 #include <string>
 
-#include "logging/Levels.h"
+#include "logging/LogSettings.h"
 
 using RZLog::Channel;
 using RZLog::Levels;

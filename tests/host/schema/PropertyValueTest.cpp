@@ -1,7 +1,7 @@
 #include <gmock/gmock.h>
 
 #include "host/schema/Schemas.h"
-#include "schema/PropertyValue.h"
+#include "schema/Literal.h"
 
 namespace cimhost::test {
 namespace {

@@ -1,7 +1,7 @@
 #include <CLI/CLI.hpp>
 
 #include "cli/Choice.h"
-#include "cli/Program.h"
+#include "cli/Commands.h"
 #include "lab/program/LoadCommand.h"
 
 // The test tool: the commands of cimhost under emulated object managers, and the load generator.
@@ -25,6 +25,13 @@ constexpr auto notes =
 /** The commands of the program, under the emulated manager. */
 class LabCommands : public CommandExtension {
 public:
+    LabCommands() {
+        program = "cimhost-lab";
+        introduction = lab::introduction;
+        examples = lab::examples;
+        notes = lab::notes;
+    }
+
     std::shared_ptr<const ManagerBehaviour> behaviour() const override { return emulationOf(manager); }
 
     void adapt(Request& request) const override {
@@ -39,7 +46,7 @@ public:
         return runLoadCommand(host, manager, load, arguments, schema);
     }
 
-    void addTo(CLI::App& app) {
+    void addTo(CLI::App& app) override {
         std::vector<std::pair<std::string, Manager>> managers;
         for (const Manager each : everyManager) {
             managers.emplace_back(nameOf(each), each);
@@ -60,11 +67,5 @@ private:
 
 int main(int count, char** values) {
     cimhost::lab::LabCommands commands;
-    cimhost::CommandLineExtension extension;
-    extension.program = "cimhost-lab";
-    extension.introduction = cimhost::lab::introduction;
-    extension.examples = cimhost::lab::examples;
-    extension.notes = cimhost::lab::notes;
-    extension.addTo = [&commands](CLI::App& app) { commands.addTo(app); };
-    return cimhost::runProgram(count, values, extension, commands);
+    return cimhost::runProgram(count, values, commands);
 }
