@@ -9,19 +9,13 @@
 
 namespace gate {
 
-/** @name Reads */
-///@{
 void enumerateInstanceNames(const ClientRequest& request);
 void enumerateInstances(const ClientRequest& request, const char** properties);
 void getInstance(const ClientRequest& request, const char** properties);
-///@}
 
-/** @name Changes */
-///@{
 void createInstance(const ClientRequest& request, const CMPIInstance* instance);
 void modifyInstance(const ClientRequest& request, const CMPIInstance* instance, const char** properties);
 void deleteInstance(const ClientRequest& request);
-///@}
 
 /**
  * @name Traversals of associations, from the request's path

@@ -96,8 +96,15 @@ void ProviderConnection::connect(const CMPIBroker* manager) {
         return;
     }
     const LockGuard guard;
-    wrapped.emplace(manager,
-                    WrappedBroker::Lock{[] { theConnection.beginUpCall(); }, [] { theConnection.endUpCall(); }});
+    const auto beginUpCall = [] {
+        ++theConnection.upCalls;
+        theRequestLock.release();
+    };
+    const auto endUpCall = [] {
+        theRequestLock.reacquire();
+        --theConnection.upCalls;
+    };
+    wrapped.emplace(manager, WrappedBroker::Lock{beginUpCall, endUpCall});
     try {
         if (library.isLoaded()) {
             createInterfaces();
@@ -122,13 +129,12 @@ void ProviderConnection::requireOwner(LockGuard& guard) {
     }
 }
 
-bool ProviderConnection::needsLoading() const {
-    return isOutdated || !library.isLoaded() || theDirectory.isOutdated();
-}
-
 void ProviderConnection::requireCurrent(LockGuard& guard, bool mayBeOlder) {
     bool isWaiting = false;
-    const auto update = [&] { return isWaiting = needsLoading() && (upCalls != 0 || !load()); };
+    const auto update = [&] {
+        const bool needsLoading = isOutdated || !library.isLoaded() || theDirectory.isOutdated();
+        return isWaiting = needsLoading && (upCalls != 0 || !load());
+    };
     waitWhile(guard, newerTimeout, update);
     if (isWaiting && mayBeOlder && library.isLoaded() && !isOutdated) {
         return;
@@ -203,16 +209,6 @@ void ProviderConnection::createInterfaces() {
     if (instances == nullptr || associations == nullptr) {
         fail(CMPI_RC_ERR_FAILED, "The provider did not return its interfaces.");
     }
-}
-
-void ProviderConnection::beginUpCall() {
-    ++upCalls;
-    theRequestLock.release();
-}
-
-void ProviderConnection::endUpCall() {
-    theRequestLock.reacquire();
-    --upCalls;
 }
 
 const CMPIBroker* ProviderConnection::broker() const {

@@ -77,12 +77,9 @@ public:
 private:
     static std::size_t bitOf(const Class& owner) { return std::size_t{1} << (&owner - Classes().begin()); }
 
-    bool needsLoading() const;
     bool load();
     void unload();
     void createInterfaces();
-    void beginUpCall();
-    void endUpCall();
     bool isConnectedTo(const CMPIBroker* manager) const;
     void set(const CMPIBroker* manager);
     void endProvider(const CMPIContext* context);
