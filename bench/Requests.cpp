@@ -26,11 +26,11 @@ constexpr const char* presentTime = "LocalDateTime";
 
 std::string described(const cimhost::NamedValue& property) {
     const std::string value = property.name == presentTime ? "now" : cimhost::formatMof(property.value);
-    return property.name + ':' + std::to_string(property.value.type) + '=' + value + '\n';
+    return property.name.string() + ':' + std::to_string(property.value.type) + '=' + value + '\n';
 }
 
 std::string described(const ResultEvent& event) {
-    if (const auto* path = std::get_if<cimhost::ObjectPath>(&event)) {
+    if (const auto* path = cimhost::resultOf<cimhost::ObjectPath>(event)) {
         return cimhost::formatObjectPath(*path);
     }
     if (const auto* instance = cimhost::resultOf<cimhost::Instance>(event)) {

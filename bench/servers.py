@@ -61,7 +61,7 @@ class Server:
         return re.findall(r"<KEYVALUE[^>]*>([^<]*)<", self.ask("EnumerateInstanceNames", CLASS).decode())
 
     def delete_created(self):
-        """Returns the number of deleted leases, also of those that requests without a client still created."""
+        """Deletes the created leases, also those of requests whose client has ended. Returns their number."""
         deleted = 0
         while created := [each for each in self.leases() if each.startswith(CREATED)]:
             for each in created:

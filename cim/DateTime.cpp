@@ -36,7 +36,7 @@ std::size_t digitCount(std::string_view string) {
     return count;
 }
 
-/** Whether a string has digits up to the end of some field, and asterisks from there on. */
+/** Whether a string consists of digits up to the end of a field, and of asterisks after that. */
 bool areFields(std::string_view string, std::initializer_list<std::size_t> ends) {
     const std::size_t known = digitCount(string);
     return all(string.substr(known), '*') && (known == 0 || std::find(ends.begin(), ends.end(), known) != ends.end());

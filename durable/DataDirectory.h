@@ -15,7 +15,7 @@ namespace durable {
 
 /**
  * The agent's data directory. The process that holds its lock is the owner, which recovers the record files and makes
- * changes. Another process only reads. Where locks are unavailable, every process is an owner, and the log says so.
+ * changes. Another process only reads. If locks are unavailable, every process is an owner, and the log reports that.
  */
 class DataDirectory {
 public:
@@ -36,7 +36,7 @@ public:
     /** The number of records of each record file: 0 if there is no file or no number, none if it cannot be read. */
     std::array<std::optional<std::size_t>, recordFileCount> recordCounts() const;
 
-    /** Whether a record file that was there is gone with its copies: then its records are only in memory. */
+    /** Whether a record file and its saved copies were removed since open(), so that its records are only in memory. */
     bool hasLostFiles() const;
 
     /** Ends the use of the saved copies, and releases the lock. Called when the provider is unloaded for the last time.
@@ -72,7 +72,7 @@ private:
     Stamp stamp() const;
     void remember(const Stamp& stamp);
 
-    /** Whether there is a record file or a copy. @param stamp the present one */
+    /** Whether there is a record file or a saved copy. @param stamp of the directory as it is now */
     bool hasStored(const Stamp& stamp) const;
 
     std::string (*path)();

@@ -52,7 +52,7 @@ bool isForeign(int descriptor) {
 }
 
 /**
- * Lets all users lock the file who may write to the directory, also if this process is of root. Another user's file
+ * Permits all users who may write to the directory to lock the file, also if root has created it. Another user's file
  * keeps its mode.
  */
 void shareWithUsersOf(const std::string& directory, int descriptor) {

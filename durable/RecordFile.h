@@ -27,7 +27,7 @@ public:
     /** @param newRecord the lines of a record without values, from the end of its identifier */
     RecordFile(const std::string& directory, const char* fileName, std::string_view newRecord);
 
-    /** The path; if NAME is a symbolic link, of its target. */
+    /** The path of the file, or of its target if it is a symbolic link. */
     const std::string& path() const { return file; }
 
     /** The content, without the last line of a copy that was restored; none if there is no file. */

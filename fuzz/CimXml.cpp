@@ -1,12 +1,11 @@
 #include <map>
 #include <string>
 
+#include "CimXmlServer.h"
 #include "Target.h"
 #include "cim/Names.h"
 #include "cimxml/ElementReader.h"
 #include "cimxml/Errors.h"
-#include "cimxml/ResponseText.h"
-#include "schema/MofReader.h"
 #include "schema/MofWriter.h"
 #include "schema/ObjectPathText.h"
 
@@ -16,7 +15,6 @@
 namespace {
 
 using namespace cimhost;
-using fuzz::require;
 using fuzz::requireSame;
 
 /** Instances by the string of their path. */
@@ -72,50 +70,6 @@ private:
     }
 };
 
-/** The server that the input is sent to. */
-class Server {
-public:
-    Server() {
-        MofReader(schema).readFile(SCHEMA_MOF);
-        for (const Class* each : schema.classes()) {
-            registry.add({each->name, "Model", "Model", true, each->isAssociation(), {"root/cimv2"}, "", "", ""});
-        }
-    }
-
-    /** The text of the response; empty for a request that is refused. */
-    std::string respond(std::string_view document) {
-        try {
-            const cimxml::Message message = cimxml::readMessage(document);
-            std::string text;
-            try {
-                write(cimxml::ResponseText(message, operations.perform(message, {"user", true})), text);
-            } catch (const cimxml::CimError& error) {
-                require(error.code > 0, "an error has a code");
-                write(cimxml::ResponseText(message, error), text);
-            }
-            return text;
-        } catch (const cimxml::RequestRefused& refused) {
-            require(refused.httpStatus == 400 || refused.httpStatus == 501, "a refusal has its status");
-            require(!refused.cimError.empty(), "a refusal has a reason");
-            return {};
-        }
-    }
-
-    const Model& model() const { return manager; }
-    const Schema& classes() const { return schema; }
-
-private:
-    static void write(cimxml::ResponseText response, std::string& text) {
-        while (response.append(text, text.size() + 1000)) {
-        }
-    }
-
-    Schema schema;
-    ProviderRegistry registry;
-    Model manager;
-    cimxml::Operations operations{schema, registry, manager, {"host", "1", {}}};
-};
-
 void requireRoundTrip(const Schema& schema, const Instance& instance) {
     std::string xml;
     cimxml::ObjectWriter("host", "root/cimv2").append(xml, instance, cimxml::ObjectForm::namedInstance);
@@ -127,19 +81,18 @@ void requireRoundTrip(const Schema& schema, const Instance& instance) {
 }  // namespace
 
 int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-    Server server;
-    const std::string text = server.respond(fuzz::inputOf(data, size));
-    if (!text.empty()) {
-        const cimxml::XmlElement root = cimxml::parseXml(text);
-        requireSame(root.name, std::string("CIM"), "root of the response");
+    Model model;
+    fuzz::CimXmlServer server(model);
+    if (const auto root = server.respond(fuzz::inputOf(data, size))) {
+        requireSame(root->name, std::string("CIM"), "root of the response");
     }
-    for (const auto& [name, instance] : server.model().instances) {
+    for (const auto& [name, instance] : model.instances) {
         try {
             cimxml::requireRepresentable(instance);
         } catch (const cimxml::CimError&) {
             continue;
         }
-        requireRoundTrip(server.classes(), instance);
+        requireRoundTrip(fuzz::CimXmlServer::classes(), instance);
     }
     return 0;
 }

@@ -1,11 +1,20 @@
 #include "SystemUnderTest.h"
 #include "gate/session/ProviderLibrary.h"
 
-// Gives the gate a provider that is linked into the fuzzer: loading it only destroys and reads its tables.
+// The gate as the system under test. Its provider is linked into the fuzzer, too: loading it only destroys and reads
+// its tables.
 
 extern "C" {
+CMPIInstanceMI* LeaseAndWarrantyGate_Create_InstanceMI(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
+CMPIAssociationMI* LeaseAndWarrantyGate_Create_AssociationMI(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
 CMPIInstanceMI* LeaseAndWarrantyProvider_Create_InstanceMI(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
 CMPIAssociationMI* LeaseAndWarrantyProvider_Create_AssociationMI(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
+}
+
+fuzz::Interfaces fuzz::openInterfaces(const CMPIBroker* broker) {
+    CMPIStatus status{CMPI_RC_OK, nullptr};
+    return {LeaseAndWarrantyGate_Create_InstanceMI(broker, nullptr, &status),
+            LeaseAndWarrantyGate_Create_AssociationMI(broker, nullptr, &status)};
 }
 
 namespace gate {

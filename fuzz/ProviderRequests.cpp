@@ -46,7 +46,7 @@ Expectation other(int rc) {
 std::string described(const cimhost::ObjectPath& path) {
     std::string description = path.nameSpace + ":" + path.className;
     for (const cimhost::NamedValue& key : path.keys) {
-        description += "," + key.name + "=" + cimhost::formatMof(key.value);
+        description += "," + key.name.string() + "=" + cimhost::formatMof(key.value);
     }
     return description;
 }
@@ -55,7 +55,7 @@ std::string described(const cimhost::Instance& instance) {
     std::string description = described(instance.path);
     for (const cimhost::NamedValue& property : instance.properties) {
         const bool isNow = property.name == "LocalDateTime";
-        description += ";" + property.name + (isNow ? "" : "=" + cimhost::formatMof(property.value));
+        description += ";" + property.name.string() + (isNow ? "" : "=" + cimhost::formatMof(property.value));
     }
     return description;
 }
@@ -190,7 +190,7 @@ private:
             require(path.nameSpace == call.request.path.nameSpace, "a path is in the request's namespace");
             shown.emplace_back();
             for (const cimhost::NamedValue& key : store == nullptr ? std::vector<cimhost::NamedValue>{} : path.keys) {
-                shown.back().push_back(key.name + "=" + cimhost::formatMof(key.value));
+                shown.back().push_back(key.name.string() + "=" + cimhost::formatMof(key.value));
             }
         }
         return shown;

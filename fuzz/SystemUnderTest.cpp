@@ -46,10 +46,10 @@ void reload() {
     new (&cache) RecordCache<RecordStore>;
 }
 
-/** Responds to enumerations of computers: the agent's computer; none; two, one without a name; or an error. */
+/** Responds to enumerations of computers. */
 class Computers : public cimhost::UpCalls {
 public:
-    void choose(std::size_t itsKind) { kind = itsKind % 4; }
+    void choose(std::size_t itsKind) { kind = itsKind % SystemUnderTest::kindsOfComputers; }
 
     cimhost::Response perform(cimhost::Request request) override {
         if (request.operation != cimhost::Operation::enumerateInstances) {

@@ -47,7 +47,13 @@ const Store* storeOf(const std::string& className);
  */
 class SystemUnderTest {
 public:
-    /** Removes all data. @param computers selects the response to enumerations of VELKO_ComputerSystem */
+    static constexpr std::size_t kindsOfComputers = 4;
+
+    /**
+     * Removes all data.
+     * @param computers the response to enumerations of VELKO_ComputerSystem: 0: the agent's computer; 1: none; 2: two,
+     * one without a name; 3: an error
+     */
     explicit SystemUnderTest(std::size_t computers);
 
     /** Calls a function of the tables. */

@@ -23,7 +23,7 @@ def from_cim(text):
 
 
 def to_cim(text):
-    """The CIM datetime of a date or time in the form of ISO 8601, or of a CIM datetime. UTC, if there is no offset.
+    """Converts a date or time in ISO 8601 form to a CIM datetime, in UTC if it has no offset. Accepts CIM datetimes, too.
     @throws ValueError for a string that is neither"""
     time = from_cim(text) if CIM_DATETIME.fullmatch(text) else datetime.datetime.fromisoformat(text)
     if time is None:

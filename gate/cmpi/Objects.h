@@ -70,7 +70,7 @@ using Values = std::vector<std::pair<const Property*, std::string>>;
  */
 std::optional<std::string> propertyOf(const CMPIInstance* instance, const Property& property);
 
-/** The values of an instance's properties that are wanted and have one. */
+/** Returns the values of the wanted properties, except those without a value. */
 template <class IsWanted>
 Values valuesOf(const CMPIInstance* instance, const Class& owner, IsWanted isWanted) {
     Values values;

@@ -21,7 +21,7 @@ public:
     ProviderConnection& operator=(const ProviderConnection&) = delete;
 
     /**
-     * Connects the provider to a broker, which from then on serves all requests. Opens the request lock if it was
+     * Connects the provider to a broker, which then serves all requests. Opens the request lock if it was
      * closed. Returns at once if the broker and its tables are those of the last call: managers call factories often,
      * possibly while they hold a lock, and must not wait for requests.
      * @throws ManagerGone if the object manager or the process is shutting down

@@ -28,7 +28,7 @@ struct ClientRequest {
         }
     }
 
-    /** The object manager's broker, of the latest factory call. Throws ManagerGone if there is none. */
+    /** The broker that the latest factory call received. Throws ManagerGone if there is none. */
     const CMPIBroker* broker() const;
 
     /** The same, but null if there is none. */
@@ -56,8 +56,8 @@ struct ClientRequest {
  * An object manager may crash while a client's object is read: SFCB does for a string that was sent as an integer.
  * Begin the session before you read a client's keys and values: then no data file is being written.
  *
- * The provider logs its errors and returns success. Where an error is visible, since the answer was not ended or has
- * another number of records than the file, it is a Failure here; a change has to be checked afterwards.
+ * The provider logs its errors and returns success. An answer that was not ended, or has
+ * another number of records than the file, is a Failure here; the caller has to check the result of a change.
  */
 class ProviderSession {
 public:

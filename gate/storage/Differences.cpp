@@ -46,7 +46,7 @@ std::string normalized(const std::string& dateTime) {
     return hasPlus ? dateTime.substr(0, offset) + "-000" : dateTime;
 }
 
-/** The value as object managers pass it on: without blanks at its ends, some also without non-ASCII letters there. */
+/** The value as object managers pass it on: without blanks, and under some without non-ASCII letters, at its ends. */
 std::string_view trimmed(std::string_view value, bool alsoNonAscii) {
     const auto stays = [&](unsigned char each) { return each > ' ' && !(alsoNonAscii && each > 0x7F); };
     const auto* begin = std::find_if(value.begin(), value.end(), stays);
@@ -55,8 +55,8 @@ std::string_view trimmed(std::string_view value, bool alsoNonAscii) {
 }
 
 /**
- * Whether a given value is the current one, as the client has read it and the object manager has passed it on. A value
- * that is writable and listed may differ from it by a non-ASCII letter at its end: that is a change.
+ * Whether a given value is the current one, as the client has read it and the object manager has passed it on. In
+ * a writable property of the property list, a different non-ASCII letter at an end is a change.
  */
 bool isCurrent(const Property& property, const CMPIInstance* current, const std::string& given, bool isListed) {
     const auto value = propertyOf(current, property);

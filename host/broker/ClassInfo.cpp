@@ -13,8 +13,8 @@ std::shared_ptr<const ClassInfo> infoOf(const Schema& schema, const Class& known
     auto info = std::make_shared<ClassInfo>();
     info->name = known.name;
     for (const Property& property : known.properties) {
-        info->properties.push_back(
-            {property.name, property.type, property.isArray, property.isKey(), property.referenceClass});
+        info->properties.push_back({Name::declared(property.name), property.type, property.isArray, property.isKey(),
+                                    property.referenceClass});
     }
     for (const Class* super = schema.findClass(known.superclass); super != nullptr;
          super = schema.findClass(super->superclass)) {

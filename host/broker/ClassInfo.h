@@ -7,13 +7,15 @@
 #include <string>
 #include <vector>
 
+#include "model/Name.h"
+
 namespace cimhost {
 
 class Schema;
 
 /** The facts of a property that the broker uses. */
 struct PropertyInfo {
-    std::string name{};
+    Name name{};
     CMPIType type = CMPI_null;  ///< element type, without CMPI_ARRAY
     bool isArray = false;
     bool isKey = false;

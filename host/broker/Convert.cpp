@@ -98,7 +98,7 @@ struct EncapsulatedWriter {
         value.ref = arena.make<CMPIObjectPath>(*path);
     }
     void operator()(const std::shared_ptr<const Instance>& instance) const {
-        value.inst = arena.make<CMPIInstance>({SharedInstance(*instance)});
+        value.inst = arena.make<CMPIInstance>({*instance});
     }
     template <class Plain>
     void operator()(const Plain&) const {}

@@ -44,14 +44,15 @@ CMPIInstance* newInstance(const CMPIBroker* broker, const CMPIObjectPath* path, 
         auto properties = initialProperties(itsPath, classInfo.get());
         const std::size_t initialCount = properties.size();
         return owner.arena().make<CMPIInstance>(
-            {SharedInstance({itsPath, std::move(properties)}), std::move(classInfo), {}, false, initialCount});
+            {Instance{itsPath, std::move(properties)}, std::move(classInfo), {}, false, initialCount});
     });
 }
 
 CMPIObjectPath* newObjectPath(const CMPIBroker* broker, const char* nameSpace, const char* className, CMPIStatus* rc) {
     return guarded<CMPIObjectPath*>(rc, nullptr, [&] {
         Arena& arena = arenaOf(broker);
-        return arena.make<CMPIObjectPath>({{}, nameSpace == nullptr ? "" : nameSpace, argument(className), {}});
+        return arena.make<CMPIObjectPath>(
+            ObjectPath{{}, nameSpace == nullptr ? "" : nameSpace, argument(className), {}});
     });
 }
 
@@ -114,7 +115,7 @@ CMPISelectExp* newSelectExp(const CMPIBroker* broker, const char*, const char*, 
 
 CMPIBoolean classPathIsA(const CMPIBroker* broker, const CMPIObjectPath* path, const char* className, CMPIStatus* rc) {
     return guarded<CMPIBoolean>(rc, 0, [&] {
-        const bool isA = Broker::of(broker).isA(argument(path).className, argument(className));
+        const bool isA = Broker::of(broker).isA(argument(path)->className, argument(className));
         return static_cast<CMPIBoolean>(isA ? 1 : 0);
     });
 }

@@ -40,7 +40,8 @@ const PropertyInfo& declarationOf(const InstanceContent& target, std::string_vie
 void checkType(const InstanceContent& target, const PropertyInfo& property, const Value& value) {
     const bool isUntypedNull = value.isNull && value.type == CMPI_null;
     if (!isUntypedNull && (value.type != property.type || value.isArray != property.isArray)) {
-        throw Failure(CMPI_RC_ERR_TYPE_MISMATCH, target.classInfo->name + "." + property.name + " has another type.");
+        throw Failure(CMPI_RC_ERR_TYPE_MISMATCH,
+                      target.classInfo->name + "." + property.name.string() + " has another type.");
     }
 }
 
@@ -77,7 +78,7 @@ void setDeclared(InstanceContent& target, std::string_view name, Value&& value) 
     if (position < target.unset) {
         return setNamed(values, name, std::move(value));
     }
-    values.emplace_back(std::string(name), std::move(value));
+    values.emplace_back(property.name == name ? property.name : Name(std::string(name)), std::move(value));
     target.unset = position + 1;
 }
 

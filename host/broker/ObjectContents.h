@@ -20,34 +20,36 @@ namespace cimhost {
 /** The kinds of encapsulated objects. */
 enum class ObjectKind { string, objectPath, instance, dateTime, array, enumeration, args, context, result, error };
 
-/** An instance that can be shared with results, and is copied when it changes after that. */
-class SharedInstance {
+/** An instance or a path that can be shared with results, and is copied when it changes after that. */
+template <class Kind>
+class Shared {
 public:
-    explicit SharedInstance(Instance initial) : instance(std::make_shared<Instance>(std::move(initial))) {}
-    SharedInstance(const SharedInstance& other) : SharedInstance(*other) {}
-    SharedInstance(SharedInstance&&) noexcept = default;
-    SharedInstance& operator=(SharedInstance) = delete;
+    Shared(Kind initial) : object(std::make_shared<Kind>(std::move(initial))) {}
+    Shared(const Shared& other) : Shared(*other) {}
+    Shared(Shared&&) noexcept = default;
+    Shared& operator=(Shared) = delete;
 
-    const Instance& operator*() const { return *instance; }
-    const Instance* operator->() const { return instance.get(); }
+    operator const Kind&() const { return *object; }
+    const Kind& operator*() const { return *object; }
+    const Kind* operator->() const { return object.get(); }
 
-    std::shared_ptr<Instance> share() const { return instance; }
+    std::shared_ptr<Kind> share() const { return object; }
 
-    /** The instance, which is copied first if it is shared. */
-    Instance& writable() {
-        if (instance.use_count() > 1) {
-            instance = std::make_shared<Instance>(*instance);
+    /** The object, which is copied first if it is shared. */
+    Kind& writable() {
+        if (object.use_count() > 1) {
+            object = std::make_shared<Kind>(*object);
         }
-        return *instance;
+        return *object;
     }
 
 private:
-    std::shared_ptr<Instance> instance;
+    std::shared_ptr<Kind> object;
 };
 
 /** Content of a CMPIInstance. */
 struct InstanceContent {
-    SharedInstance value;
+    Shared<Instance> value;
     std::shared_ptr<const ClassInfo> classInfo{};  ///< null if the class is unknown
     PropertyList accepted{};                       ///< the property filter; none accepts every property
     bool filtersKeys = false;                      ///< whether the filter also applies to keys
@@ -93,7 +95,7 @@ struct TraitsOf {
 
 // clang-format off
 template <> struct Traits<CMPIString> : TraitsOf<std::string, ObjectKind::string, &FunctionTables::string> {};
-template <> struct Traits<CMPIObjectPath> : TraitsOf<ObjectPath, ObjectKind::objectPath, &FunctionTables::objectPath> {};
+template <> struct Traits<CMPIObjectPath> : TraitsOf<Shared<ObjectPath>, ObjectKind::objectPath, &FunctionTables::objectPath> {};
 template <> struct Traits<CMPIInstance> : TraitsOf<InstanceContent, ObjectKind::instance, &FunctionTables::instance> {};
 template <> struct Traits<CMPIDateTime> : TraitsOf<DateTime, ObjectKind::dateTime, &FunctionTables::dateTime> {};
 template <> struct Traits<CMPIArray> : TraitsOf<ArrayContent, ObjectKind::array, &FunctionTables::array> {};

@@ -8,7 +8,7 @@ namespace {
 std::string describe(const std::vector<NamedValue>& values) {
     std::string all;
     for (const NamedValue& each : values) {
-        all += each.name + " = " + formatMof(each.value) + "\n";
+        all += each.name.string() + " = " + formatMof(each.value) + "\n";
     }
     return all;
 }

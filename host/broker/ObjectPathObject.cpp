@@ -1,3 +1,5 @@
+#include <string_view>
+
 #include "broker/Convert.h"
 #include "broker/Encapsulation.h"
 #include "broker/FunctionTables.h"
@@ -10,8 +12,9 @@ namespace {
 template <std::string ObjectPath::*part>
 CMPIStatus setPart(CMPIObjectPath* path, const char* value) {
     return guarded([&] {
-        std::string& target = content(path).*part;
-        target = argument(value);
+        Shared<ObjectPath>& target = content(path);
+        const std::string_view changed = argument(value);
+        target.writable().*part = changed;
     });
 }
 
@@ -19,19 +22,19 @@ template <std::string ObjectPath::*part>
 CMPIString* getPart(const CMPIObjectPath* path, CMPIStatus* rc) {
     return guarded<CMPIString*>(rc, nullptr, [&] {
         const auto& object = self(path);
-        return arenaFor(object).make<CMPIString>((*object.content).*part);
+        return arenaFor(object).make<CMPIString>((**object.content).*part);
     });
 }
 
 CMPIStatus addKey(CMPIObjectPath* path, const char* name, const CMPIValue* value, const CMPIType type) {
     return guarded([&] {
-        ObjectPath& target = content(path);
+        Shared<ObjectPath>& target = content(path);
         const std::string_view key = argument(name);
         Value converted = valueFrom(value, type);
         if (key.empty() || converted.isNull) {
             throw Failure(CMPI_RC_ERR_INVALID_PARAMETER);  // a key always has a value
         }
-        setNamed(target.keys, key, std::move(converted));
+        setNamed(target.writable().keys, key, std::move(converted));
     });
 }
 
@@ -43,7 +46,7 @@ template <class Read>
 CMPIData keyData(const CMPIObjectPath* path, CMPIStatus* rc, Read read) {
     const CMPIData data = guarded(rc, badData(), [&] {
         const auto& object = self(path);
-        CMPIData found = read(object.content->keys, arenaFor(object));
+        CMPIData found = read((*object.content)->keys, arenaFor(object));
         found.state = static_cast<CMPIValueState>(found.state | CMPI_keyValue);
         return found;
     });
@@ -62,12 +65,12 @@ CMPIData getKeyAt(const CMPIObjectPath* path, CMPICount index, CMPIString** name
 }
 
 CMPICount getKeyCount(const CMPIObjectPath* path, CMPIStatus* rc) {
-    return guarded<CMPICount>(rc, 0, [&] { return static_cast<CMPICount>(content(path).keys.size()); });
+    return guarded<CMPICount>(rc, 0, [&] { return static_cast<CMPICount>(content(path)->keys.size()); });
 }
 
 /** Copies the namespace and the class of a path. @return the content of the target */
 ObjectPath& copyClass(CMPIObjectPath* path, const CMPIObjectPath* source) {
-    ObjectPath& target = content(path);
+    ObjectPath& target = content(path).writable();
     const ObjectPath& from = argument(source);
     target.nameSpace = from.nameSpace;
     target.className = from.className;
@@ -81,7 +84,7 @@ CMPIStatus setNameSpaceFromObjectPath(CMPIObjectPath* path, const CMPIObjectPath
 CMPIStatus setHostAndNameSpaceFromObjectPath(CMPIObjectPath* path, const CMPIObjectPath* source) {
     return guarded([&] {
         ObjectPath& target = copyClass(path, source);
-        target.host = argument(source).host;
+        target.host = argument(source)->host;
     });
 }
 
@@ -98,7 +101,7 @@ CMPIData noQualifier(const CMPIObjectPath* path, Names..., CMPIStatus* rc) {
 CMPIString* toString(const CMPIObjectPath* path, CMPIStatus* rc) {
     return guarded<CMPIString*>(rc, nullptr, [&] {
         const auto& object = self(path);
-        return arenaFor(object).make<CMPIString>(formatObjectPath(*object.content));
+        return arenaFor(object).make<CMPIString>(formatObjectPath(**object.content));
     });
 }
 

@@ -25,7 +25,7 @@ CMPIObjectPath* RequestScope::objectPath(const ObjectPath& path) {
 CMPIInstance* RequestScope::instance(const Instance& instance) {
     auto classInfo = broker.classInfo(instance.path.className);
     const std::size_t unset = classInfo == nullptr ? 0 : classInfo->properties.size();
-    return objects.make<CMPIInstance>({SharedInstance(instance), std::move(classInfo), {}, false, 0, unset});
+    return objects.make<CMPIInstance>({instance, std::move(classInfo), {}, false, 0, unset});
 }
 
 CMPIResult* RequestScope::result(ResultEvents& events, const ResultRules& rules) {

@@ -54,7 +54,7 @@ CMPIStatus returnObjectPath(const CMPIResult* result, const CMPIObjectPath* path
     return guarded([&] {
         ResultContent& target = content(result);
         recordNull(target, path);
-        target.events->emplace_back(argument(path));
+        target.events->emplace_back(argument(path).share());
         if (target.rules.keepsPaths) {
             noticeRelease(target, path);
         }

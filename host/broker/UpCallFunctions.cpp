@@ -102,7 +102,7 @@ CMPIInstance* getInstance(const CMPIBroker* handle, const CMPIContext* context, 
         Broker& broker = Broker::of(handle);
         Response response =
             performed(broker, context, Request::getInstance(argument(path), propertyListFrom(properties)));
-        return broker.arena().make<CMPIInstance>({SharedInstance(firstOf(response.instances))});
+        return broker.arena().make<CMPIInstance>({firstOf(response.instances)});
     });
 }
 

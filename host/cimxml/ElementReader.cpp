@@ -220,7 +220,7 @@ Instance ElementReader::instance(const XmlElement& element) const {
         NamedValue property = this->property(each, known);
         const auto same = [&](const NamedValue& other) { return cim::sameName(other.name, property.name); };
         if (std::any_of(instance.properties.begin(), instance.properties.end(), same)) {
-            invalid("Property " + property.name + " is there twice.");
+            invalid("Property " + property.name.string() + " is there twice.");
         }
         const Property* declared = known != nullptr ? known->findProperty(property.name) : nullptr;
         if (declared != nullptr && declared->isKey() && !property.value.isNull) {

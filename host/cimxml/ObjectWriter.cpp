@@ -103,12 +103,11 @@ std::string_view elementOfContent(const Value& value) {
     return value.type == CMPI_ref ? "" : "VALUE";
 }
 
-std::string startTagOf(const NamedValue& property, const Property* declared) {
-    std::string xml;
+void appendStartTagOf(std::string& xml, const NamedValue& property, std::string_view origin) {
     appendStartTag(xml, elementOf(property.value), [&] {
         appendAttribute(xml, "NAME", property.name);
-        if (declared != nullptr) {
-            appendAttribute(xml, "CLASSORIGIN", declared->origin);
+        if (!origin.empty()) {
+            appendAttribute(xml, "CLASSORIGIN", origin);
         }
         if (property.value.type != CMPI_ref) {
             appendAttribute(xml, "TYPE", xmlType(property.value.type));
@@ -117,7 +116,6 @@ std::string startTagOf(const NamedValue& property, const Property* declared) {
             appendAttribute(xml, "EmbeddedObject", "instance");
         }
     });
-    return xml;
 }
 
 /** References and embedded instances have elements inside of their value. */
@@ -146,7 +144,8 @@ struct ScalarCheck {
 
 void requireRepresentable(const Value& value, const std::string& className, const std::string& name) {
     for (const Scalar& scalar : value.elements()) {
-        if (!std::visit(ScalarCheck{}, scalar)) {
+        const auto* string = std::get_if<std::string>(&scalar);  // the usual case, without a call through a table
+        if (string != nullptr ? !isRepresentable(*string) : !std::visit(ScalarCheck{}, scalar)) {
             throw CimError(CMPI_RC_ERR_FAILED,
                            "The value of " + className + "." + name + " has a character that XML cannot represent.");
         }
@@ -154,6 +153,33 @@ void requireRepresentable(const Value& value, const std::string& className, cons
 }
 
 }  // namespace
+
+struct ObjectWriter::Tags {
+    Name name{};
+    CMPIType type = CMPI_null;
+    bool isArray = false;
+    bool isNull = true;
+    std::string origin{};
+    std::string start{};
+    std::string end{};
+
+    /** Makes the tags again unless the last object had the same property or key at this position. */
+    template <class Make>
+    void update(const NamedValue& named, std::string_view itsOrigin, Make make) {
+        const Value& value = named.value;
+        const bool isSame = name == named.name && type == value.type && isArray == value.isArray &&
+                            isNull == value.isNull && origin == itsOrigin && !start.empty();
+        if (!isSame) {
+            *this = {named.name, value.type, value.isArray, value.isNull, std::string(itsOrigin)};
+            make();
+        }
+    }
+
+    static Tags& at(std::size_t position, std::vector<Tags>& known) {
+        known.resize(std::max(known.size(), position + 1));
+        return known[position];
+    }
+};
 
 void requireRepresentable(const ObjectPath& path) {
     for (const NamedValue& key : path.keys) {
@@ -197,51 +223,39 @@ void ObjectWriter::append(std::string& xml, const ObjectPath& path, ObjectForm f
 }
 
 void ObjectWriter::appendInstance(std::string& xml, const Instance& instance, const InstanceParts& parts) const {
+    thread_local std::vector<Tags> ofProperties;
     const Element element(xml, "INSTANCE", [&] { appendAttribute(xml, "CLASSNAME", instance.path.className); });
     const Class* known = parts.origins != nullptr ? parts.origins->findClass(instance.path.className) : nullptr;
     std::size_t position = 0;
     for (const NamedValue& property : instance.properties) {
         if (parts.haveAllProperties() || isWanted(property.name, parts)) {
-            appendProperty(xml, property, known != nullptr ? known->findProperty(property.name) : nullptr, position++);
+            const Property* declared = known != nullptr ? known->findProperty(property.name) : nullptr;
+            const std::string_view origin = declared != nullptr ? declared->origin : std::string_view();
+            appendProperty(xml, property, origin, Tags::at(position++, ofProperties));
         }
     }
 }
 
-void ObjectWriter::appendProperty(std::string& xml, const NamedValue& property, const Property* declared,
-                                  std::size_t position) const {
+void ObjectWriter::appendProperty(std::string& xml, const NamedValue& property, std::string_view origin,
+                                  Tags& tags) const {
     const Value& value = property.value;
     if (!isSimple(value)) {
-        xml += startTagOf(property, declared);
+        appendStartTagOf(xml, property, origin);
         appendValue(xml, value);
         return appendEndTag(xml, elementOf(value));
     }
-    const Tags& tags = tagsFrom(ofProperties, position, property, declared, [&](Tags& made) {
+    tags.update(property, origin, [&] {
         const std::string_view content = elementOfContent(value);
-        made.start = startTagOf(property, declared);
+        appendStartTagOf(tags.start, property, origin);
         if (!content.empty()) {
-            appendStartTag(made.start, content, [] {});
-            appendEndTag(made.end, content);
+            appendStartTag(tags.start, content, [] {});
+            appendEndTag(tags.end, content);
         }
-        appendEndTag(made.end, elementOf(value));
+        appendEndTag(tags.end, elementOf(value));
     });
     xml += tags.start;
     appendContent(xml, value);
     xml += tags.end;
-}
-
-template <class Make>
-const ObjectWriter::Tags& ObjectWriter::tagsFrom(TagsByPosition& known, std::size_t position, const NamedValue& named,
-                                                 const Property* declared, Make make) {
-    known.resize(std::max(known.size(), position + 1));
-    Tags& tags = known[position];
-    const Value& value = named.value;
-    const bool areSame = tags.name == named.name && tags.type == value.type && tags.isArray == value.isArray &&
-                         tags.isNull == value.isNull && tags.declared == declared && !tags.start.empty();
-    if (!areSame) {
-        tags = {named.name, value.type, value.isArray, value.isNull, declared};
-        make(tags);
-    }
-    return tags;
 }
 
 void ObjectWriter::appendValue(std::string& xml, const Value& value) const {
@@ -293,14 +307,15 @@ void ObjectWriter::appendReference(std::string& xml, const ObjectPath& path) con
 }
 
 void ObjectWriter::appendInstanceName(std::string& xml, const ObjectPath& path) const {
+    thread_local std::vector<Tags> ofKeys;
     const Element name(xml, "INSTANCENAME", [&] { appendAttribute(xml, "CLASSNAME", path.className); });
     std::size_t position = 0;
     for (const NamedValue& key : path.keys) {
-        appendKey(xml, key, position++);
+        appendKey(xml, key, Tags::at(position++, ofKeys));
     }
 }
 
-void ObjectWriter::appendKey(std::string& xml, const NamedValue& key, std::size_t position) const {
+void ObjectWriter::appendKey(std::string& xml, const NamedValue& key, Tags& tags) const {
     const auto appendBinding = [&](std::string& tag) {
         appendStartTag(tag, "KEYBINDING", [&] { appendAttribute(tag, "NAME", key.name); });
     };
@@ -309,13 +324,13 @@ void ObjectWriter::appendKey(std::string& xml, const NamedValue& key, std::size_
         appendContent(xml, key.value);
         return appendEndTag(xml, "KEYBINDING");
     }
-    const Tags& tags = tagsFrom(ofKeys, position, key, nullptr, [&](Tags& made) {
-        appendBinding(made.start);
-        appendStartTag(made.start, "KEYVALUE", [&] {
-            appendAttribute(made.start, "VALUETYPE", valueTypeOf(key.value.type));
-            appendAttribute(made.start, "TYPE", xmlType(key.value.type));
+    tags.update(key, {}, [&] {
+        appendBinding(tags.start);
+        appendStartTag(tags.start, "KEYVALUE", [&] {
+            appendAttribute(tags.start, "VALUETYPE", valueTypeOf(key.value.type));
+            appendAttribute(tags.start, "TYPE", xmlType(key.value.type));
         });
-        made.end = "</KEYVALUE></KEYBINDING>";
+        tags.end = "</KEYVALUE></KEYBINDING>";
     });
     xml += tags.start;
     appendContent(xml, key.value);

@@ -2,6 +2,7 @@
 
 #include <optional>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "model/Request.h"
@@ -30,7 +31,7 @@ struct InstanceParts {
     bool haveAllProperties() const { return !properties && onlyOf == nullptr; }
 };
 
-/** Appends CIM objects as CIM-XML elements to a string. Not thread-safe. */
+/** Appends CIM objects as CIM-XML elements to a string. */
 class ObjectWriter {
 public:
     /**
@@ -54,38 +55,22 @@ public:
     void appendValue(std::string& xml, const Value& value) const;
 
 private:
+    /**
+     * The tags around the content of a property or a key. The objects that a thread writes usually have the same
+     * properties and keys in the same order, so it keeps the tags by position.
+     */
+    struct Tags;
+
     void appendNameSpacePath(std::string& xml, const ObjectPath& path) const;
     void appendLocalNameSpacePath(std::string& xml, const std::string& itsNameSpace) const;
-    void appendProperty(std::string& xml, const NamedValue& property, const Property* declared,
-                        std::size_t position) const;
-    void appendKey(std::string& xml, const NamedValue& key, std::size_t position) const;
+    void appendProperty(std::string& xml, const NamedValue& property, std::string_view origin, Tags& tags) const;
+    void appendKey(std::string& xml, const NamedValue& key, Tags& tags) const;
     void appendReference(std::string& xml, const ObjectPath& path) const;
     void appendContent(std::string& xml, const Value& value) const;
     void appendScalar(std::string& xml, const Scalar& scalar) const;
 
-    /** The tags around the content of a property or a key, and what they depend on. */
-    struct Tags {
-        std::string name{};
-        CMPIType type = CMPI_null;
-        bool isArray = false;
-        bool isNull = true;
-        const Property* declared = nullptr;
-        std::string start{};
-        std::string end{};
-    };
-
-    /** By position: the objects of a response usually have the same properties and keys in the same order. */
-    using TagsByPosition = std::vector<Tags>;
-
-    /** The tags that the last object had at this position if they are right for this one, or new ones. */
-    template <class Make>
-    static const Tags& tagsFrom(TagsByPosition& known, std::size_t position, const NamedValue& named,
-                                const Property* declared, Make make);
-
     std::string host;
     std::string nameSpace;
-    mutable TagsByPosition ofProperties{};
-    mutable TagsByPosition ofKeys{};
 };
 
 /**

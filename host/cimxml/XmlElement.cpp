@@ -51,12 +51,51 @@ void requireFewAttributes(std::string_view document) {
     }
 }
 
+/** The parser of this thread, for one document: making a parser takes longer than parsing a usual request. */
+class BorrowedParser {
+public:
+    BorrowedParser(xmlSAXHandler events, void* builder) {
+        if (ofThread() == nullptr) {
+            ofThread().reset(xmlCreatePushParserCtxt(&events, nullptr, nullptr, 0, nullptr));
+        }
+        // After a reset, a parser reads UTF-8 whatever the first bytes are.
+        if (ofThread() == nullptr || xmlCtxtResetPush(get(), nullptr, 0, nullptr, nullptr) != 0) {
+            throw std::bad_alloc();
+        }
+        get()->userData = builder;
+    }
+    /** Frees the document, and the parser if it has stored many names. */
+    ~BorrowedParser() {
+        constexpr std::size_t mostBytesOfNames = std::size_t{64} << 10U;
+        xmlCtxtReset(get());
+        if (xmlDictGetUsage(get()->dict) > mostBytesOfNames) {
+            ofThread().reset();
+        }
+    }
+    BorrowedParser(const BorrowedParser&) = delete;
+    BorrowedParser& operator=(const BorrowedParser&) = delete;
+
+    xmlParserCtxt* get() const { return ofThread().get(); }
+
+private:
+    using Parser = std::unique_ptr<xmlParserCtxt, decltype(&xmlFreeParserCtxt)>;
+
+    static Parser& ofThread() {
+        thread_local Parser parser(nullptr, &xmlFreeParserCtxt);
+        return parser;
+    }
+};
+
 /** Builds the tree from the events of libxml2's parser. */
 class TreeBuilder {
 public:
     explicit TreeBuilder(const XmlLimits& itsLimits) : limits(itsLimits) {}
 
     XmlElement build(std::string_view document) {
+        constexpr std::string_view byteOrderMark = "\xEF\xBB\xBF";
+        if (document.substr(0, byteOrderMark.size()) == byteOrderMark) {
+            document.remove_prefix(byteOrderMark.size());
+        }
         static const bool isInitialized = (xmlInitParser(), true);
         static_cast<void>(isInitialized);
         if (document.size() > static_cast<std::size_t>(std::numeric_limits<int>::max())) {
@@ -66,13 +105,8 @@ public:
             throw XmlError("the document is not UTF-8, or has a character that XML cannot represent");
         }
         requireFewAttributes(document);
-        xmlSAXHandler events = handler();
-        const std::unique_ptr<xmlParserCtxt, decltype(&xmlFreeParserCtxt)> context(
-            xmlCreatePushParserCtxt(&events, this, nullptr, 0, nullptr), &xmlFreeParserCtxt);
-        if (context == nullptr) {
-            throw std::bad_alloc();
-        }
-        parser = context.get();
+        const BorrowedParser borrowed(handler(), this);
+        parser = borrowed.get();
         // Without XML_PARSE_NOENT, ampersands of attributes would remain encoded. There are no entities to declare.
         // A declared encoding such as UTF-7 could hide attributes from requireFewAttributes().
         xmlCtxtUseOptions(parser, XML_PARSE_NONET | XML_PARSE_NOENT | XML_PARSE_IGNORE_ENC);

@@ -1,6 +1,8 @@
 #include "cimxml/XmlWriter.h"
 
 #include <array>
+#include <cstdint>
+#include <cstring>
 
 #include "cim/Utf8.h"
 
@@ -51,6 +53,22 @@ std::size_t plainLength(std::string_view characters) {
     return length;
 }
 
+/** Number of leading bytes that are ASCII without control characters. Compares eight at a time. */
+std::size_t asciiLength(std::string_view characters) {
+    constexpr std::uint64_t ones = 0x0101010101010101;
+    std::size_t length = 0;
+    for (std::uint64_t word = 0; length + sizeof word <= characters.size(); length += sizeof word) {
+        std::memcpy(&word, characters.data() + length, sizeof word);
+        if ((((word - ones * ' ') | word) & (ones * 0x80)) != 0) {
+            break;
+        }
+    }
+    while (length < characters.size() && static_cast<signed char>(characters[length]) >= ' ') {
+        ++length;
+    }
+    return length;
+}
+
 }  // namespace
 
 void appendEscaped(std::string& xml, std::string_view characters) {
@@ -83,7 +101,7 @@ void appendAttribute(std::string& xml, std::string_view name, std::string_view v
 
 bool isRepresentable(std::string_view characters) {
     while (true) {
-        characters.remove_prefix(plainLength(characters));
+        characters.remove_prefix(asciiLength(characters));
         if (characters.empty()) {
             return true;
         }

@@ -68,7 +68,7 @@ public:
 private:
     void add(NamedValue value) {
         if (findNamed(values, value.name) != nullptr) {
-            throw UsageError("property " + value.name + " is given twice");
+            throw UsageError("property " + value.name.string() + " is given twice");
         }
         values.push_back(std::move(value));
     }

@@ -41,10 +41,10 @@ struct NullResult {};
 
 /**
  * One call of a result function: an instance, an object path, data, an error or null was returned, or returnDone. An
- * instance that only the event refers to may be changed.
+ * instance or a path that only the event refers to may be changed.
  */
-using ResultEvent =
-    std::variant<std::shared_ptr<Instance>, ObjectPath, Value, std::shared_ptr<const ErrorInfo>, NullResult, Done>;
+using ResultEvent = std::variant<std::shared_ptr<Instance>, std::shared_ptr<ObjectPath>, Value,
+                                 std::shared_ptr<const ErrorInfo>, NullResult, Done>;
 
 /** The results of a provider, in order, as they were at the time of the call. */
 using ResultEvents = std::vector<ResultEvent>;
@@ -57,6 +57,10 @@ struct AlternativeFor {
 template <>
 struct AlternativeFor<Instance> {
     using Type = std::shared_ptr<Instance>;
+};
+template <>
+struct AlternativeFor<ObjectPath> {
+    using Type = std::shared_ptr<ObjectPath>;
 };
 template <>
 struct AlternativeFor<ErrorInfo> {

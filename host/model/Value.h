@@ -12,6 +12,8 @@
 #include <variant>
 #include <vector>
 
+#include "model/Name.h"
+
 namespace cimhost {
 
 struct ObjectPath;
@@ -102,10 +104,10 @@ struct Value {
 /** A named value: a key of an object path or a property of an instance. */
 struct NamedValue {
     NamedValue() = default;
-    NamedValue(std::string itsName, Value&& itsValue) : name(std::move(itsName)), value(std::move(itsValue)) {}
-    NamedValue(std::string itsName, const Value& itsValue) : name(std::move(itsName)), value(itsValue) {}
+    NamedValue(Name itsName, Value&& itsValue) : name(std::move(itsName)), value(std::move(itsValue)) {}
+    NamedValue(Name itsName, const Value& itsValue) : name(std::move(itsName)), value(itsValue) {}
 
-    std::string name{};
+    Name name{};
     Value value{};
 };
 

@@ -30,7 +30,7 @@ Status ManagerBehaviour::statusOf(const ProviderResponse& response, Operation op
 
 StatusOr<ObjectPath> ManagerBehaviour::createdPath(const ProviderResponse& response) const {
     for (const ResultEvent& event : response.events) {
-        if (const auto* path = std::get_if<ObjectPath>(&event)) {
+        if (const auto* path = resultOf<ObjectPath>(event)) {
             return {{}, *path};
         }
         if (const auto* instance = resultOf<Instance>(event)) {

@@ -11,7 +11,7 @@
 namespace cimhost {
 namespace {
 
-void addIfMissing(ContextEntries& entries, const char* name, Value value) {
+void addIfMissing(ContextEntries& entries, const Name& name, Value value) {
     if (findNamed(entries, name) == nullptr) {
         entries.push_back({name, std::move(value)});
     }
@@ -71,7 +71,7 @@ ObjectManager::~ObjectManager() = default;
 
 void ObjectManager::completeContext(Request& request) const {
     for (const NamedValue& entry : baseContext) {
-        addIfMissing(request.context, entry.name.c_str(), entry.value);
+        addIfMissing(request.context, entry.name, entry.value);
     }
     addIfMissing(request.context, CMPIInvocationFlags, Value::of(CMPI_uint32, std::uint32_t{0}));
     addIfMissing(request.context, CMPIInitNameSpace, Value::of(request.path.nameSpace));

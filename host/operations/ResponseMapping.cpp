@@ -36,11 +36,9 @@ bool isExpected(const ResultEvent& event) {
 }
 
 /** The result of an event, which it leaves unless it is kept or shared. */
-ObjectPath takeResult(ObjectPath& path, bool keeps) {
-    return keeps ? path : std::move(path);
-}
-Instance takeResult(std::shared_ptr<Instance>& instance, bool keeps) {
-    return keeps || instance.use_count() > 1 ? *instance : std::move(*instance);
+template <class Kind>
+Kind takeResult(std::shared_ptr<Kind>& result, bool keeps) {
+    return keeps || result.use_count() > 1 ? *result : std::move(*result);
 }
 
 /** Appends all results of this kind; an error if there are others. They leave the events, unless these are kept. */

@@ -308,7 +308,7 @@ private:
         for (const Node* assignment : children<mof::Assignment>(node)) {
             NamedValue property = buildAssignment(*assignment, *declared);
             if (findNamed(instance.properties, property.name) != nullptr) {
-                fail(*assignment, property.name + " is given twice");
+                fail(*assignment, property.name.string() + " is given twice");
             }
             instance.properties.push_back(std::move(property));
         }

@@ -72,7 +72,7 @@ std::string formatValue(const Value& value, Quote quote);
 std::string formatInstance(const Instance& instance) {
     std::string mof = "instance of " + instance.path.className + " {\n";
     for (const NamedValue& property : instance.properties) {
-        mof += "    " + property.name + " = " + formatValue(property.value, &inLiterals) + ";\n";
+        mof += "    " + property.name.string() + " = " + formatValue(property.value, &inLiterals) + ";\n";
     }
     return mof + "};\n";
 }

@@ -109,7 +109,7 @@ std::string formatObjectPath(const ObjectPath& path) {
     uri += path.className;
     char separator = '.';
     for (const NamedValue& key : path.keys) {
-        uri += separator + key.name + "=" + formatMof(key.value);
+        uri += separator + key.name.string() + "=" + formatMof(key.value);
         separator = ',';
     }
     return uri;

@@ -59,9 +59,14 @@ void Connection::trust() {
     isTrusted = true;
 }
 
-void Connection::waitUntil(Clock::time_point time) {
+void Connection::waitUntil(Clock::time_point time, const std::function<bool()>& isDone) {
     std::unique_lock<std::mutex> lock(mutex);
-    ended.wait_until(lock, time, [&] { return cause != Cause::none; });
+    changed.wait_until(lock, time, [&] { return cause != Cause::none || isDone(); });
+}
+
+void Connection::wake() {
+    const Guard lock(mutex);
+    changed.notify_all();
 }
 
 bool Connection::hasTimedOut() const {
@@ -85,11 +90,13 @@ void Connection::end(Cause why) {
         return;
     }
     cause = why;
-    if (why == Cause::time && current == Phase::body) {
+    // During the head, the thread of a TLS connection may be sending a refusal.
+    const bool hasSlowHead = current == Phase::idle && headSince != Clock::time_point{} && !tls;
+    if (why == Cause::time && (current == Phase::body || hasSlowHead)) {
         sendTimeout();
     }
     ::shutdown(descriptor, SHUT_RDWR);
-    ended.notify_all();
+    changed.notify_all();
 }
 
 /** The thread of the connection only receives in this phase: a TLS session permits another thread to send. */
@@ -240,6 +247,11 @@ void ConnectionTable::endOverdue(Connection::Clock::time_point now) {
             each.end(Connection::Cause::time);
         }
     }
+}
+
+void ConnectionTable::endStalledResponse() {
+    const Guard lock(mutex);
+    endOne([](const Connection& each) { return each.phase() == Connection::Phase::response; });
 }
 
 void ConnectionTable::endAll() {

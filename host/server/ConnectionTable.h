@@ -48,8 +48,13 @@ public:
     /** Notes that the client has sent a request that was accepted: its connection is ended for new ones later. */
     void trust();
 
-    /** Waits, but not longer than until the connection is ended. */
-    void waitUntil(Clock::time_point time);
+    /**
+     * Waits until a time, but not longer than until a condition is true or the connection is ended.
+     * @param isDone its value must be atomic; call wake() after a change
+     */
+    void waitUntil(
+        Clock::time_point time, const std::function<bool()>& isDone = [] { return false; });
+    void wake();
 
     /** Whether the table has ended it. */
     bool isEnding() const;
@@ -90,7 +95,7 @@ private:
     gnutls_session_t session = nullptr;  ///< of a TLS connection after its handshake
     const ClientAddress origin;
     mutable std::mutex mutex;
-    std::condition_variable ended;
+    std::condition_variable changed;  ///< the cause, or what waitUntil() waits for
     Cause cause = Cause::none;
     Phase current;
     bool isTrusted = false;
@@ -102,10 +107,10 @@ private:
 };
 
 /**
- * All connections. Ends those that exceed a time limit; a client that sends its body too slowly receives 408. If there
- * are too many connections, of one network or altogether, each new one ends another: first those that were refused,
- * then those without an accepted password or request, then those whose body does not arrive, then idle ones, then those
- * that do not receive their response, at last those whose body arrives; of several the oldest.
+ * All connections. Ends those that exceed a time limit; a client that sends its request too slowly receives 408. If
+ * there are too many connections, of one network or altogether, each new one ends another: first those that were
+ * refused, then those without an accepted password or request, then those whose body does not arrive, then idle ones,
+ * then those that do not receive their response, at last those whose body arrives; of several the oldest.
  */
 class ConnectionTable {
 public:
@@ -127,6 +132,9 @@ public:
 
     /** Ends connections that have exceeded their time. To be called several times per second. */
     void endOverdue(Connection::Clock::time_point now);
+
+    /** Ends the oldest connection with a client that does not receive its response, if there is one. */
+    void endStalledResponse();
 
     /** Ends all connections, also those that are added later; those at work end when the operation has ended. */
     void endAll();

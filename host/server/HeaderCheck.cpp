@@ -1,8 +1,9 @@
 #include "server/HeaderCheck.h"
 
 #include <algorithm>
-#include <array>
+#include <cctype>
 #include <charconv>
+#include <limits>
 
 namespace cimhost::server {
 namespace {
@@ -56,25 +57,45 @@ bool isUtf8Xml(const std::string& type) {
            (charset.empty() || cim::sameName(charset, "utf-8") || cim::sameName(charset, "us-ascii"));
 }
 
-std::optional<HttpResponse> checkBody(const Headers& headers, std::size_t largest) {
-    if (headers.count("Content-Length") > 1 ||
-        (headers.count("Content-Length") == 1 && headers.count("Transfer-Encoding") != 0)) {
+bool isName(const std::string& name) {
+    constexpr std::string_view others = "!#$%&'*+-.^_`|~";
+    return !name.empty() && std::all_of(name.begin(), name.end(), [&](char each) {
+        return std::isalnum(static_cast<unsigned char>(each)) != 0 || others.find(each) != std::string_view::npos;
+    });
+}
+
+/** Refuses a head for which other software could see another end of the request, and so another next request. */
+std::optional<HttpResponse> checkFraming(const Headers& headers) {
+    const auto isWrong = [](const auto& each) {
+        return !isName(each.first) || each.second.find_first_of("\r\n") != std::string::npos;
+    };
+    if (headers.count("Host") > 1 || std::any_of(headers.begin(), headers.end(), isWrong)) {
+        return refusal(400, "A header is malformed, or the header Host is repeated.");
+    }
+    const std::size_t lengths = headers.count("Content-Length");
+    if (lengths + headers.count("Transfer-Encoding") > 1) {
         return refusal(400, "The length of the body is ambiguous.");
     }
-    if (const auto length = headerIn(headers, "Content-Length")) {
-        std::uint64_t bytes = 0;
-        const char* const end = length->data() + length->size();
-        const auto result = std::from_chars(length->data(), end, bytes);
-        if (result.ptr != end || result.ec == std::errc::invalid_argument) {
-            return refusal(400, "Content-Length is not a number.");
-        }
-        if (result.ec != std::errc{} || bytes > largest) {
-            return tooLarge(largest);
-        }
+    const std::string length = headerIn(headers, "Content-Length").value_or("");
+    if (lengths != 0 && (length.empty() || length.find_first_not_of("0123456789") != std::string::npos)) {
+        return refusal(400, "Content-Length is not a number.");
+    }
+    const auto encoding = headerIn(headers, "Transfer-Encoding");
+    if (encoding && !cim::sameName(*encoding, "chunked")) {
+        return refusal(400, "The only supported transfer encoding is chunked.");
+    }
+    return std::nullopt;
+}
+
+std::optional<HttpResponse> checkBody(const Headers& headers, std::size_t largest) {
+    if (lengthIn(headers).value_or(0) > largest) {
+        return tooLarge(largest);
     }
     const auto encoding = headerIn(headers, "Content-Encoding");
     const auto type = headerIn(headers, "Content-Type");
-    if (!type || !isUtf8Xml(*type) || (encoding && !cim::sameName(*encoding, "identity"))) {
+    const bool isEncoded =
+        headers.count("Content-Encoding") != 0 && !(encoding && cim::sameName(*encoding, "identity"));
+    if (!type || !isUtf8Xml(*type) || isEncoded) {
         return refusal(415, "Send application/xml or text/xml in UTF-8.");
     }
     return std::nullopt;
@@ -92,9 +113,9 @@ std::optional<HttpResponse> checkProtocol(const Headers& headers, const std::str
         return refusal(400, "The header CIMOperation must be MethodCall.");
     }
     const auto version = headerIn(headers, prefix + "CIMProtocolVersion");
-    if (version && version->rfind("1.", 0) != 0) {
-        return refusal(400, "Protocol version " + *version + " is not supported; send 1.0.",
-                       "unsupported-protocol-version");
+    const bool hasVersion = headers.count(prefix + "CIMProtocolVersion") != 0;
+    if (hasVersion && (!version || version->rfind("1.", 0) != 0)) {
+        return refusal(400, "The header CIMProtocolVersion must be 1.0.", "unsupported-protocol-version");
     }
     return std::nullopt;
 }
@@ -170,8 +191,25 @@ HttpResponse withExtension(HttpResponse response, const std::string& prefix) {
     return response;
 }
 
+std::optional<std::uint64_t> lengthIn(const Headers& headers) {
+    const auto length = headerIn(headers, "Content-Length");
+    if (!length) {
+        return std::nullopt;
+    }
+    std::uint64_t bytes = 0;
+    const auto result = std::from_chars(length->data(), length->data() + length->size(), bytes);
+    return result.ec == std::errc{} ? bytes : std::numeric_limits<std::uint64_t>::max();
+}
+
+bool mayHaveBody(const Headers& headers) {
+    return checkFraming(headers) || headers.count("Transfer-Encoding") != 0 || lengthIn(headers).value_or(0) != 0;
+}
+
 std::variant<CimHeaders, HttpResponse> checkHeaders(const HttpRequest& request, const HeaderRules& rules) {
     const Headers& headers = request.headers;
+    if (auto wrong = checkFraming(headers)) {
+        return *wrong;
+    }
     if (rules.requiresLocalHost && !isLocalHost(headerIn(headers, "Host").value_or(""))) {
         return refusal(403, "This server answers requests to localhost only.");
     }

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstdint>
 #include <optional>
 #include <string>
 #include <variant>
@@ -23,6 +24,12 @@ struct HeaderRules {
 
 /** Checks the head of a request. @return the headers of the operation, or the response that ends the request */
 std::variant<CimHeaders, HttpResponse> checkHeaders(const HttpRequest& request, const HeaderRules& rules);
+
+/** The value of Content-Length, the largest number if it is too large for one; none if the header is absent. */
+std::optional<std::uint64_t> lengthIn(const Headers& headers);
+
+/** Whether a body follows a head, or may follow it because its length is ambiguous. */
+bool mayHaveBody(const Headers& headers);
 
 /** The prefix of the headers of an extension for CIM operations, "NN-", in an M-POST request; empty if there is none.
  */

@@ -11,18 +11,14 @@
 namespace cimhost::server {
 namespace {
 
-constexpr std::size_t blockSize = std::size_t{32} << 10U;
 constexpr std::size_t headSize = std::size_t{64} << 10U;  ///< of a request, with its target; also the send buffer
-
-/** Connections that the HTTP library may have besides the limit: those that are being ended for new ones. */
-constexpr std::size_t endingConnections = 128;
 
 using Response = std::unique_ptr<MHD_Response, decltype(&MHD_destroy_response)>;
 
 /** The text of a response that is sent in blocks. */
 struct Stream {
     std::shared_ptr<cimxml::ResponseText> source;
-    std::string block;     ///< not yet sent
+    std::string block;     ///< the next part
     std::size_t sent = 0;  ///< bytes of the block
 };
 
@@ -55,12 +51,11 @@ Response bufferResponse(const std::string& body) {
  * A short text as it is, with its length; a long one in chunks that are written when they are sent. After a response
  * in chunks, all of the connection are: OpenPegasus' client library expects them.
  */
-Response textResponse(std::shared_ptr<cimxml::ResponseText> text, Connection& connection) {
-    auto stream = std::make_unique<Stream>(Stream{std::move(text), {}, 0});
-    const bool isLong = stream->source->append(stream->block, blockSize);
-    if (!isLong && !connection.usesChunks) {
-        return bufferResponse(stream->block);
+Response textResponse(CimReply reply, Connection& connection) {
+    if (reply.isComplete && !connection.usesChunks) {
+        return bufferResponse(reply.beginning);
     }
+    auto stream = std::make_unique<Stream>(Stream{std::move(reply.text), std::move(reply.beginning), 0});
     connection.usesChunks = true;
     return {MHD_create_response_from_callback(MHD_SIZE_UNKNOWN, blockSize, &readStream, stream.release(),
                                               [](void* context) { delete static_cast<Stream*>(context); }),
@@ -199,13 +194,12 @@ struct HttpServer::Endpoint {
         if (!exchange.connection->enter(Connection::Phase::work)) {
             return MHD_NO;
         }
-        const Reply reply = server.handler.finish(exchange);
+        Reply reply = server.handler.finish(exchange);
         exchange.connection->enter(Connection::Phase::response);
         if (const auto* refused = std::get_if<HttpResponse>(&reply)) {
             return send(connection, exchange, *refused);
         }
-        const Response response =
-            textResponse(std::get<std::shared_ptr<cimxml::ResponseText>>(reply), *exchange.connection);
+        const Response response = textResponse(std::get<CimReply>(std::move(reply)), *exchange.connection);
         addCimHeaders(response.get(), exchange.extensionPrefix);
         return queue(connection, exchange, response, MHD_HTTP_OK);
     }
@@ -318,6 +312,9 @@ void HttpServer::watch() {
     std::unique_lock<std::mutex> lock(mutex);
     while (!ending.wait_for(lock, period, [&] { return isEnding; })) {
         table.endOverdue(std::chrono::steady_clock::now());
+        if (handler.isShortOfResults()) {
+            table.endStalledResponse();
+        }
         handler.removeExpired();
     }
 }

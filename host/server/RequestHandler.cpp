@@ -30,13 +30,14 @@ RequestHandler::RequestHandler(const Settings& itsSettings, cimxml::Operations& 
       operations(itsOperations),
       authenticator(itsAuthenticator),
       accessLog(itsLog),
-      slots(itsSettings.limits.requestsAtWork) {}
+      requests(itsSettings.limits.requestsAtWork),
+      results(itsSettings.limits.responseResults) {}
 
 std::optional<HttpResponse> RequestHandler::begin(Exchange& exchange, const HttpRequest& request) {
-    const std::string length = headerIn(request.headers, "Content-Length").value_or("0");
     exchange.extensionPrefix = extensionPrefixOf(request);
     auto refused = check(exchange, request);
-    exchange.isBodyIgnored = refused && (length != "0" || request.headers.count("Transfer-Encoding") != 0);
+    exchange.isBodyIgnored = refused && mayHaveBody(request.headers);
+    exchange.length = lengthIn(request.headers);
     return refused ? std::optional(withExtension(*refused, exchange.extensionPrefix)) : std::nullopt;
 }
 
@@ -62,7 +63,7 @@ std::optional<HttpResponse> RequestHandler::authenticate(Exchange& exchange, con
     exchange.record.user = credentials->user;
     const auto right = verified(exchange, *authorization);
     if (!right) {
-        return unavailable("The server has too many connections.");
+        return unavailable("The server has too many passwords to check.");
     }
     if (*right == Right::none) {
         exchange.connection->enter(Connection::Phase::refusal);
@@ -76,7 +77,7 @@ std::optional<HttpResponse> RequestHandler::authenticate(Exchange& exchange, con
 
 /**
  * Passwords are checked once per connection and minute, since PAM modules take long.
- * @return none if the connection was ended before its turn
+ * @return none if other checks took too long, or the connection was ended before its turn
  */
 std::optional<Right> RequestHandler::verified(Exchange& exchange, const std::string& authorization) {
     const Credentials credentials = *credentialsFrom(authorization);
@@ -84,8 +85,8 @@ std::optional<Right> RequestHandler::verified(Exchange& exchange, const std::str
     Connection& connection = *exchange.connection;
     const bool isKnown = connection.authorization == authorization && now < connection.authorizedUntil;
     if (!isKnown) {
-        const std::lock_guard<std::mutex> lock(authentication);
-        if (connection.isEnding()) {
+        const PasswordQueue::Turn turn(passwords, connection, now + settings.limits.queueTime);
+        if (!turn || connection.isEnding()) {
             return std::nullopt;
         }
         if (!authenticator.accepts(credentials)) {
@@ -126,9 +127,14 @@ Reply RequestHandler::answer(Exchange& exchange) {
     if (exchange.refused) {
         return *exchange.refused;
     }
+    if (exchange.length.value_or(exchange.body.size()) != exchange.body.size()) {
+        // The HTTP library ignores a Content-Length in a continued header line.
+        exchange.isBodyIgnored = true;
+        return refusal(400, "The body does not have the length that Content-Length says.");
+    }
     exchange.connection->trust();
-    const RequestSlots::Held slot(slots, settings.limits.queueTime);
-    if (!slot) {
+    const Quota::Share share(requests, 1, settings.limits.queueTime);
+    if (!share) {
         return unavailable("The server has too many requests.");
     }
     try {
@@ -148,14 +154,16 @@ Reply RequestHandler::perform(Exchange& exchange) {
         return *disagreement;
     }
     exchange.record.className = cimxml::Operations::subjectOf(message);
+    return begun(exchange, respond(exchange, message));
+}
+
+cimxml::ResponseText RequestHandler::respond(Exchange& exchange, const cimxml::Message& message) {
     const auto failed = [&](const cimxml::CimError& error) {
         exchange.record.cimStatus = error.code;
-        return std::make_shared<cimxml::ResponseText>(message, error);
+        return cimxml::ResponseText(message, error);
     };
     try {
-        auto text = std::make_shared<cimxml::ResponseText>(message, operations.perform(message, exchange.caller));
-        exchange.record.objects = text->count();
-        return text;
+        return {message, operations.perform(message, exchange.caller)};
     } catch (const cimxml::RequestRefused&) {
         throw;
     } catch (const cimxml::CimError& error) {
@@ -163,6 +171,23 @@ Reply RequestHandler::perform(Exchange& exchange) {
     } catch (const std::exception& error) {
         return failed({CMPI_RC_ERR_FAILED, error.what()});
     }
+}
+
+/** A long response holds its results until the client has received it: those of all clients together are limited. */
+Reply RequestHandler::begun(Exchange& exchange, cimxml::ResponseText text) {
+    struct Unfinished {
+        explicit Unfinished(cimxml::ResponseText itsText) : text(std::move(itsText)) {}
+        cimxml::ResponseText text;
+        std::optional<Quota::Share> share{};
+    };
+    const auto response = std::make_shared<Unfinished>(std::move(text));
+    CimReply reply{{response, &response->text}};
+    reply.isComplete = !reply.text->append(reply.beginning, blockSize);
+    if (!reply.isComplete && !response->share.emplace(results, reply.text->count(), settings.limits.queueTime)) {
+        return unavailable("Other clients have not received their results yet.");
+    }
+    exchange.record.objects = reply.text->count();
+    return reply;
 }
 
 void RequestHandler::log(Exchange& exchange, unsigned httpStatus) const {

@@ -3,7 +3,6 @@
 #include <atomic>
 #include <chrono>
 #include <memory>
-#include <mutex>
 #include <optional>
 #include <string>
 #include <variant>
@@ -14,10 +13,13 @@
 #include "server/Authentication.h"
 #include "server/ConnectionTable.h"
 #include "server/HeaderCheck.h"
-#include "server/RequestSlots.h"
+#include "server/PasswordQueue.h"
+#include "server/Quota.h"
 #include "server/Settings.h"
 
 namespace cimhost::server {
+
+constexpr std::size_t blockSize = std::size_t{32} << 10U;  ///< bytes of a response that are written together
 
 /** One HTTP request and its response, from its head to the end of its response. */
 struct Exchange {
@@ -27,6 +29,7 @@ struct Exchange {
     CimHeaders headers{};           ///< of a request that has passed the checks
     std::string extensionPrefix{};  ///< of the headers of an M-POST request, else empty
     cimxml::Caller caller{};
+    std::optional<std::uint64_t> length{};  ///< of the body, if a header has it
     std::string body{};
     bool isBodyIgnored = false;             ///< whether the response is sent before the body has arrived
     std::optional<HttpResponse> refused{};  ///< the response to a body that is too large, once its rest has arrived
@@ -36,8 +39,15 @@ struct Exchange {
     std::chrono::steady_clock::time_point start = std::chrono::steady_clock::now();
 };
 
-/** The text of a CIM response, or an HTTP response without one. */
-using Reply = std::variant<HttpResponse, std::shared_ptr<cimxml::ResponseText>>;
+/** A CIM response whose text is written while it is sent, except for its beginning. */
+struct CimReply {
+    std::shared_ptr<cimxml::ResponseText> text{};
+    std::string beginning{};
+    bool isComplete = false;  ///< whether the beginning is the complete text
+};
+
+/** A CIM response, or an HTTP response without one. */
+using Reply = std::variant<HttpResponse, CimReply>;
 
 /** Checks, authenticates and performs requests. Called concurrently. */
 class RequestHandler {
@@ -64,6 +74,9 @@ public:
     void logIncomplete(Exchange& exchange) const;
     void logIncomplete(const Connection& connection) const;
 
+    /** Whether a response waits until clients have received others. */
+    bool isShortOfResults() const { return results.isAwaited(); }
+
     /** Ends open enumerations whose timeout has passed. */
     void removeExpired() { operations.removeExpired(); }
 
@@ -77,13 +90,16 @@ private:
     std::optional<Right> verified(Exchange& exchange, const std::string& authorization);
     Reply answer(Exchange& exchange);
     Reply perform(Exchange& exchange);
+    cimxml::ResponseText respond(Exchange& exchange, const cimxml::Message& message);
+    Reply begun(Exchange& exchange, cimxml::ResponseText text);
 
     const Settings& settings;
     cimxml::Operations& operations;
     Authenticator& authenticator;
-    std::mutex authentication;  ///< for calls of the authenticator
+    PasswordQueue passwords;  ///< for calls of the authenticator
     const AccessLog& accessLog;
-    RequestSlots slots;
+    Quota requests;  ///< at work
+    Quota results;   ///< of unfinished responses
     std::atomic<bool> stopping{false};
 };
 

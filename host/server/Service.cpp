@@ -14,6 +14,7 @@
 #include "server/AccessLog.h"
 #include "server/Certificates.h"
 #include "server/HttpServer.h"
+#include "server/Sockets.h"
 
 namespace cimhost::server {
 namespace {
@@ -94,6 +95,7 @@ std::vector<Listener> activatedListeners() {
 void serve(const Settings& settings, cimxml::Operations& operations, Authenticator& authenticator,
            const std::function<void(const std::string&)>& announce) {
     checkSettings(settings);
+    requireOpenFiles(settings.limits.connections, settings.listeners.size());
     const bool usesTls = std::any_of(settings.listeners.begin(), settings.listeners.end(),
                                      [](const Listener& each) { return each.tls; });
     const auto certificates = usesTls ? std::make_unique<Certificates>(settings.certificate, settings.key) : nullptr;

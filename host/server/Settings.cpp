@@ -17,6 +17,9 @@ std::string causeOf(const std::string& problem) {
     return problem.substr(0, problem.rfind("; "));
 }
 
+/** Each connection has a thread and a file; the unit of the service permits that many. */
+constexpr std::int64_t mostConnections = 20'000;
+
 void readNumber(TableReader& table, const char* key, std::size_t& target, std::int64_t most) {
     target = static_cast<std::size_t>(table.number(key, 1, most).value_or(static_cast<std::int64_t>(target)));
 }
@@ -27,14 +30,18 @@ void readSeconds(TableReader& table, const char* key, std::chrono::seconds& targ
 }
 
 void readLimits(TableReader table, Limits& limits) {
-    readNumber(table, "connections", limits.connections, 100'000);
-    readNumber(table, "connections_per_address", limits.connectionsPerAddress, 100'000);
+    readNumber(table, "connections", limits.connections, mostConnections);
+    readNumber(table, "connections_per_address", limits.connectionsPerAddress, mostConnections);
     readNumber(table, "requests_at_work", limits.requestsAtWork, 10'000);
+    readNumber(table, "response_results", limits.responseResults, 1'000'000'000);
     readNumber(table, "request_bytes", limits.requestBytes, std::int64_t{1} << 30U);
     readNumber(table, "xml_depth", limits.xmlDepth, 200);
     readNumber(table, "xml_elements", limits.xmlElements, 10'000'000);
     readNumber(table, "open_enumerations", limits.enumerations.open, 1'000'000);
     readNumber(table, "enumeration_results", limits.enumerations.results, 1'000'000'000);
+    limits.enumerations.mostObjects = static_cast<std::uint32_t>(
+        table.number("pull_objects", 1, 1'000'000'000).value_or(limits.enumerations.mostObjects));
+    readSeconds(table, "enumeration_default_seconds", limits.enumerations.timeout);
     readSeconds(table, "queue_seconds", limits.queueTime);
     readSeconds(table, "head_seconds", limits.headTime);
     readSeconds(table, "body_seconds", limits.bodyTime);

@@ -5,6 +5,7 @@
 #include <netinet/in.h>
 #include <poll.h>
 #include <sys/ioctl.h>
+#include <sys/resource.h>
 #include <unistd.h>
 
 #include <array>
@@ -36,6 +37,20 @@ std::string addressText(const sockaddr* address) {
     }
     const bool isSix = address->sa_family == AF_INET6;
     return (isSix ? "[" : "") + std::string(host.data()) + (isSix ? "]:" : ":") + port.data();
+}
+
+void requireOpenFiles(std::size_t connections, std::size_t listeners) {
+    constexpr std::size_t others = 256;  // of the server and the providers
+    const std::size_t needed = connections + listeners * endingConnections + others;
+    rlimit files{};
+    ::getrlimit(RLIMIT_NOFILE, &files);
+    files.rlim_cur = files.rlim_max;
+    ::setrlimit(RLIMIT_NOFILE, &files);
+    if (files.rlim_max < needed) {
+        throw SettingsError("limits.connections = " + std::to_string(connections) + " needs " + std::to_string(needed) +
+                            " open files, but this process may open " + std::to_string(files.rlim_max) +
+                            "; lower it, or raise the limit (ulimit -Hn, LimitNOFILE of the service)");
+    }
 }
 
 int openSocket(const Listener& listener) {

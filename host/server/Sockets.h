@@ -10,8 +10,17 @@
 
 namespace cimhost::server {
 
+/** Connections that a listener may have besides the limit: those that are being ended for new ones. */
+constexpr std::size_t endingConnections = 128;
+
 /** Opens a listening socket. @throws SettingsError if the address cannot be used */
 int openSocket(const Listener& listener);
+
+/**
+ * Raises the limit of open files of this process as far as that is permitted.
+ * @throws SettingsError if it remains below the number that the connections need
+ */
+void requireOpenFiles(std::size_t connections, std::size_t listeners);
 
 /** The port of a listening socket. */
 std::uint16_t portOf(int socket);

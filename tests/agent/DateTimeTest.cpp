@@ -13,7 +13,7 @@ namespace {
 
 const std::string noDate = "00000000000000.000000-000";
 
-std::string thereAndBack(const std::string& text) {
+std::string dateRoundTrip(const std::string& text) {
     return Utils::convertCIMDateTime(Utils::convertStringToDateTime(text));
 }
 
@@ -26,14 +26,14 @@ TEST(DateTime, IsNoDateAtFirst) {
 TEST(DateTime, KeepsItsString) {
     for (const char* text : {"20240229123456.000789-330", "19700101000000.000000+000", "20240101000000.999999-000",
                              "99991231235959.000000+999", "00000101000000.000000+720"}) {
-        EXPECT_EQ(thereAndBack(text), text);
+        EXPECT_EQ(dateRoundTrip(text), text);
     }
 }
 
 TEST(DateTime, IsNoDateIfTheStringIsInvalid) {
     for (const char* text : {"", "00000000000000.000000-000", "20230229000000.000000+000", "2024-02-29",
                              "20240229250000.000000+000", "00000010120000.000000:000"}) {
-        EXPECT_EQ(thereAndBack(text), noDate) << text;
+        EXPECT_EQ(dateRoundTrip(text), noDate) << text;
     }
 }
 

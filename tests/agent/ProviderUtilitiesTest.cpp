@@ -33,7 +33,7 @@ protected:
 
     ObjectPath valueOf(const CMPIObjectPath* object) {
         result->ft->returnObjectPath(result, object);
-        return std::get<ObjectPath>(events.back());
+        return *cimhost::resultOf<ObjectPath>(events.back());
     }
 
     Instance valueOf(const CMPIInstance* object) {

@@ -64,7 +64,7 @@ TEST(ReplacementFile, KeepsTheOwner) {
 struct stat statusAfterReplacement(const TemporaryDirectory& directory, const std::vector<gid_t>& groupsOfReplacer) {
     constexpr uid_t otherUser = 65534;
     EXPECT_EQ(::chown(directory.path().c_str(), otherUser, otherUser), 0);
-    const auto replaceAsSomebody = [&] {
+    const auto replaceAsOtherUser = [&] {
         if (::setgroups(groupsOfReplacer.size(), groupsOfReplacer.data()) != 0 || ::setgid(otherUser) != 0 ||
             ::setuid(otherUser) != 0) {
             std::_Exit(2);
@@ -72,7 +72,7 @@ struct stat statusAfterReplacement(const TemporaryDirectory& directory, const st
         replaceFile(directory.file("file"), "new");
         std::_Exit(0);
     };
-    EXPECT_EXIT(replaceAsSomebody(), testing::ExitedWithCode(0), "");
+    EXPECT_EXIT(replaceAsOtherUser(), testing::ExitedWithCode(0), "");
     EXPECT_EQ(directory.read("file"), "new");
     struct stat status {};
     EXPECT_EQ(::stat(directory.file("file").c_str(), &status), 0);

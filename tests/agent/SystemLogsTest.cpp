@@ -176,7 +176,7 @@ TEST_F(SystemLogForm, IsThatOfTheCLibraryForTheSystemLog) {
     EXPECT_THAT(message(log, 3000), EndsWith(": trace 3000 Ostrel.Test getLessor() in Lease.cpp:42: some\\ntext"));
 }
 
-TEST_F(SystemLogForm, IsTheJournalsOwnForTheJournal) {
+TEST_F(SystemLogForm, HasTheJournalsFieldsForTheJournal) {
     const SystemLog log{"log", &RZLog::openJournal};
     EXPECT_EQ(message(log, 3000),
               "MESSAGE=trace 3000 Ostrel.Test getLessor() in Lease.cpp:42: some\\ntext\nPRIORITY=3\n"

@@ -239,7 +239,7 @@ TEST_P(HostileTextTest, LogRecordsCannotBeForged) {
     }
 }
 
-TEST_P(HostileTextTest, ADuplicateIsLoggedAlikeForAnyIdentifier) {
+TEST_P(HostileTextTest, ADuplicateIsLoggedTheSameForAnyIdentifier) {
     for (const std::string& hostile : hostileStrings()) {
         restartEmpty();
         create(hostile);

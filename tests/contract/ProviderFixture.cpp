@@ -85,7 +85,7 @@ std::vector<std::string> identifiersOf(const std::vector<Instance>& instances) {
 std::vector<std::string> shown(const std::vector<NamedValue>& values) {
     std::vector<std::string> strings;
     for (const NamedValue& each : values) {
-        strings.push_back(each.name + "=" + cimhost::formatMof(each.value));
+        strings.push_back(each.name.string() + "=" + cimhost::formatMof(each.value));
     }
     return strings;
 }

@@ -146,7 +146,7 @@ TEST_F(DataDirectoryTest, HasChangedForAForkedChildOfItsOwner) {
     EXPECT_EQ(status, 0);
 }
 
-TEST_F(DataDirectoryTest, HasLostAFileThatWasThereAndIsGoneWithItsCopies) {
+TEST_F(DataDirectoryTest, HasLostFilesIfAFileAndItsCopiesAreRemoved) {
     EXPECT_TRUE(directory.open());
     EXPECT_FALSE(directory.hasLostFiles());
     recordFileIn(path, "Warranty.dat").prepare(oneWarranty);

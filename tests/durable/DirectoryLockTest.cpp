@@ -40,7 +40,7 @@ protected:
         }));
     }
 
-    /** The result of a process of another user or, unless this one is of root, of the same user. */
+    /** Returns the result in a child process; as an unprivileged user if the test runs as root. */
     State stateOfAnotherUser() {
         return static_cast<State>(inChild([&] {
             constexpr uid_t unprivileged = 65534;

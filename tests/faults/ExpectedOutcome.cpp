@@ -44,8 +44,8 @@ bool isPartOf(const ObjectPath& path, const ObjectPath& whole) {
 }
 
 bool isPartOf(const ResultEvent& event, const ResultEvent& whole) {
-    if (const auto* path = std::get_if<ObjectPath>(&event)) {
-        const auto* wholePath = std::get_if<ObjectPath>(&whole);
+    if (const auto* path = cimhost::resultOf<ObjectPath>(event)) {
+        const auto* wholePath = cimhost::resultOf<ObjectPath>(whole);
         return wholePath != nullptr && isPartOf(*path, *wholePath);
     }
     const auto* instance = cimhost::resultOf<Instance>(event);
@@ -147,7 +147,7 @@ void expectSetInOrder(const ExpectedOutcome& expected, const Request& request, c
     std::vector<Lines> possible{partial};
     for (const NamedValue& property : request.instance.properties) {
         for (std::size_t line = 0; line < partial.size(); ++line) {
-            if (partial[line].rfind(property.name + "=", 0) == 0) {
+            if (partial[line].rfind(property.name.string() + "=", 0) == 0) {
                 partial[line] = expected.after.at(line);
             }
         }

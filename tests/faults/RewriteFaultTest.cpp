@@ -38,7 +38,7 @@ protected:
         return {operationWrite, number, lasting, error};
     }
 
-    std::string wholeFile() {
+    std::string completeFile() {
         restart();
         environment.ask(requestNamed("ModifyLease"));
         return environment.files().at(leaseFile);
@@ -73,14 +73,14 @@ protected:
 };
 
 TEST_F(RewriteFaultTest, AFullDiskKeepsTheLinesWrittenBefore) {
-    const std::string whole = wholeFile();
+    const std::string whole = completeFile();
     for (int number = 1; number <= writesOfRewrite; ++number) {
         ASSERT_EQ(rewriteWith(writeFailing(number, true)), firstLines(whole, number - 1));
     }
 }
 
 TEST_F(RewriteFaultTest, AFailedLineIsTheLast) {
-    const std::string whole = wholeFile();
+    const std::string whole = completeFile();
     for (int number = 1; number <= writesOfRewrite; ++number) {
         ASSERT_EQ(rewriteWith(writeFailing(number, false)), firstLines(whole, number))
             << "it is written when the file is closed, and no further line";
@@ -88,7 +88,7 @@ TEST_F(RewriteFaultTest, AFailedLineIsTheLast) {
 }
 
 TEST_F(RewriteFaultTest, PartialAndInterruptedWritesAreCompleted) {
-    const std::string whole = wholeFile();
+    const std::string whole = completeFile();
     for (const int number : {1, 2, writesOfRewrite / 2, writesOfRewrite}) {
         EXPECT_EQ(rewriteWith(writeFailing(number, false, EINTR)), whole);
         EXPECT_EQ(rewriteWith(writeFailing(number, true, 0)), whole) << "each partially";
@@ -98,7 +98,7 @@ TEST_F(RewriteFaultTest, PartialAndInterruptedWritesAreCompleted) {
 /** The modification ends at the failed allocation and keeps the properties set so far, in file order. */
 TEST_F(RewriteFaultTest, OneFailedAllocationKeepsTheFileOrWritesItWithTheValuesSetSoFar) {
     const std::string before = leaseRecords(leases);
-    const std::string whole = wholeFile();
+    const std::string whole = completeFile();
     const int allocations = allocationsOfRewrite();
     std::vector<std::string> possible;
     for (int line = 0; line <= writesOfRewrite; ++line) {
@@ -128,14 +128,14 @@ TEST_F(RewriteFaultTest, AFailedOpenKeepsTheFile) {
 }
 
 TEST_F(RewriteFaultTest, AFailedCloseWritesTheCompleteFile) {
-    const std::string whole = wholeFile();
+    const std::string whole = completeFile();
     for (const bool lasting : {false, true}) {
         EXPECT_EQ(rewriteWith({operationClose, 1, lasting, EIO}), whole);
     }
 }
 
 TEST_F(RewriteFaultTest, ARestartLoadsCompleteRecordsAndCopiesInPlaceOfTheRest) {
-    wholeFile();
+    completeFile();
     const std::vector<Lines> before = leasesListed();
     EXPECT_EQ(rewriteWith(writeFailing(1, true)), "");
     environment.unload();
@@ -155,7 +155,7 @@ TEST_F(RewriteFaultTest, ARestartLoadsCompleteRecordsAndCopiesInPlaceOfTheRest) 
 }
 
 TEST_F(RewriteFaultTest, TheNextChangeInTheSameProcessWritesEverything) {
-    const std::string whole = wholeFile();
+    const std::string whole = completeFile();
     for (const int number : {1, 2, 60, writesOfRewrite}) {
         rewriteWith(writeFailing(number, true));
         environment.ask(repairOf(leaseFile));

@@ -176,7 +176,7 @@ Lines TestEnvironment::instancesOf(const std::string& className) {
     for (const cimhost::Instance& instance : library().enumerateInstances(path).instances()) {
         for (const cimhost::NamedValue& property : instance.properties) {
             if (property.name != "LocalDateTime") {
-                lines.push_back(property.name + "=" + cimhost::formatMof(property.value));
+                lines.push_back(property.name.string() + "=" + cimhost::formatMof(property.value));
             }
         }
     }

@@ -82,7 +82,7 @@ protected:
         for (const Instance& instance : outcome.instances()) {
             answers.push_back(testsupport::toText(instance.path));
             for (const NamedValue& property : instance.properties) {
-                answers.push_back(property.name + " = " + cimhost::formatMof(property.value));
+                answers.push_back(property.name.string() + " = " + cimhost::formatMof(property.value));
             }
         }
         return answers;

@@ -2,7 +2,7 @@
 //
 // Usage: gate_kill_run KILLS [SEED]
 //
-// Exits with status 1 if an acknowledged change is lost, a refused or unanswered one is there in part, or a record
+// Exits with status 1 if an acknowledged change is lost, a refused or unanswered one is stored in part, or a record
 // appears twice or was created by no client.
 
 #include <sys/wait.h>
@@ -125,7 +125,7 @@ void serve(Knowledge& knowledge, unsigned int seed) {
     }
 }
 
-/** Returns the value of a lease; -1 if it is there in part. */
+/** Returns the value of a lease; -1 if only a part of its values is stored. */
 int valueOf(const Instance& instance) {
     const int value = std::atoi(valueIn(instance, "LeaseTerm").value_or("0").c_str());
     return value > 0 && valueIn(instance, "Lessor") == lessorOf(value) ? value : -1;
@@ -140,7 +140,7 @@ int check(Knowledge& knowledge) {
     for (const Instance& instance : response.instances) {
         const std::string id = valueIn(instance, "InstanceID").value_or("(none)");
         if (!found.emplace(id, valueOf(instance)).second) {
-            std::cout << id << " is there twice\n";
+            std::cout << id << " occurs twice\n";
             ++errors;
         }
     }

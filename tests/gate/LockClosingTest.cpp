@@ -313,7 +313,7 @@ TEST(LockClosingTest, AForkedChildDoesNotWait) {
     inside.join();
 }
 
-TEST(LockClosingTest, ARequestWithoutItsManagerGetsNoSessionAndReleasesTheLock) {
+TEST(LockClosingTest, ARequestWithoutItsManagerHasNoSessionAndReleasesTheLock) {
     const gate::ClientRequest late{nullptr, nullptr, nullptr, gate::theRequestLock.generation() + 1};
     EXPECT_THROW(gate::ProviderSession{late}, gate::ManagerGone);
     const gate::ClientRequest inTime{nullptr, nullptr, nullptr, gate::theRequestLock.generation()};

@@ -14,21 +14,21 @@ using testsupport::dateTime;
 
 using LossyValuesTest = GateTest;
 
-const std::vector<std::pair<std::string, std::string>> lossyTexts{{"ACME_Leasing", "underscore"},
-                                                                  {"two\nlines", "line break"},
-                                                                  {"a\ttab", "tab"},
-                                                                  {"a\rb", "line break"},
-                                                                  {" leading", "blank"},
-                                                                  {"trailing ", "blank"},
-                                                                  {"two  blanks", "blanks"},
-                                                                  {"*", "*"},
-                                                                  {"x", "one character"},
-                                                                  {" ", "blank"}};
+const std::vector<std::pair<std::string, std::string>> lossyStrings{{"ACME_Leasing", "underscore"},
+                                                                    {"two\nlines", "line break"},
+                                                                    {"a\ttab", "tab"},
+                                                                    {"a\rb", "line break"},
+                                                                    {" leading", "blank"},
+                                                                    {"trailing ", "blank"},
+                                                                    {"two  blanks", "blanks"},
+                                                                    {"*", "*"},
+                                                                    {"x", "one character"},
+                                                                    {" ", "blank"}};
 
 TEST_F(LossyValuesTest, AreRefusedWithAReasonAndNothingIsStored) {
     create("L1", {named("Lessor", text("ACME"))});
     const std::string stored = testsupport::readFile(dataFile("Lease.dat"));
-    for (const auto& [value, reason] : lossyTexts) {
+    for (const auto& [value, reason] : lossyStrings) {
         const auto refused = isRefused(CMPI_RC_ERR_INVALID_PARAMETER, reason);
         EXPECT_THAT(modify("L1", {named("LeaseTerm", uint32(1)), named("Lessor", text(value))}), refused) << value;
         EXPECT_THAT(create("L2", {named("BaseRent", text(value))}), refused) << value;

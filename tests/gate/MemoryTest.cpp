@@ -183,8 +183,8 @@ protected:
 TEST_P(MemoryTest, NoAllocationFailureThrowsOrBreaksTheNextRequest) {
     create("bystander", {named("Lessor", text("First"))});
     create(firstNode, {named("Lessor", text("ACME"))});
-    bool goesOn = true;
-    for (long number = 1; goesOn && !HasFailure(); ++number) {
+    bool allocationFailed = true;
+    for (long number = 1; allocationFailed && !HasFailure(); ++number) {
         if (GetParam().pathsClass == warranty) {
             gate().deleteInstance(keyedPath(warranty, firstNode));
         }
@@ -192,7 +192,7 @@ TEST_P(MemoryTest, NoAllocationFailureThrowsOrBreaksTheNextRequest) {
             create(firstNode, {}, warranty);
         }
         Outcome outcome;
-        goesOn = run(number, outcome);
+        allocationFailed = run(number, outcome);
         EXPECT_FALSE(outcome.threw) << "allocation " << number;
         EXPECT_EQ(outcome.message.empty(), outcome.rc == CMPI_RC_OK) << "allocation " << number;
         EXPECT_THAT(identifiers(), ElementsAre("bystander", firstNode)) << "allocation " << number;
@@ -207,8 +207,8 @@ INSTANTIATE_TEST_SUITE_P(Gate, MemoryTest, testing::ValuesIn(entryPoints),
                          [](const auto& parameter) { return std::string(parameter.param.name); });
 
 TEST(FactoryMemoryTest, NoAllocationFailureThrows) {
-    bool goesOn = true;
-    for (long number = 1; goesOn; ++number) {
+    bool allocationFailed = true;
+    for (long number = 1; allocationFailed; ++number) {
         testsupport::RecordingBroker broker;
         testsupport::ProviderLibrary library(testsupport::underTest(GATE_LIBRARY), "LeaseAndWarrantyGate", broker);
         auto* factory = library.function<CMPIInstanceMI*(const CMPIBroker*, const CMPIContext*, CMPIStatus*)>(
@@ -216,7 +216,7 @@ TEST(FactoryMemoryTest, NoAllocationFailureThrows) {
         CMPIStatus status{CMPI_RC_OK, nullptr};
         failingAllocation = number;
         const CMPIInstanceMI* made = factory(broker.handle(), nullptr, &status);
-        goesOn = failingAllocation == 0;
+        allocationFailed = failingAllocation == 0;
         failingAllocation = 0;
         EXPECT_EQ(made == nullptr, status.rc != CMPI_RC_OK) << "allocation " << number;
         EXPECT_EQ(status.msg == nullptr, status.rc == CMPI_RC_OK) << "allocation " << number;

@@ -55,7 +55,7 @@ public:
 private:
     static constexpr uid_t unprivileged = 65534;
 
-    /** Lets this thread read all files, as the libraries may be in a directory of root, but write none of them. */
+    /** Lets this thread read all files, since root may own the libraries' directory, but write none of root's. */
     static void permitReading() {
         __user_cap_header_struct header{_LINUX_CAPABILITY_VERSION_3, 0};
         __user_cap_data_struct sets[_LINUX_CAPABILITY_U32S_3]{};

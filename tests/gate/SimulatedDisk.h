@@ -12,9 +12,9 @@
 #include "support/AgentEnvironment.h"
 #include "support/Files.h"
 
-// The states that a file system may have after a power failure. Of the changes that were not synced, any subset may be
-// there: of the names, and of the writes to each file. A write may also be there in part, and the file may have the
-// size that it has with the writes that are missing. A truncation takes effect before the writes that follow it.
+// The states that a file system may have after a power failure. It may have any subset of the changes that were not
+// synced: of the names, and of the writes to each file. A write may be partial, and a file may have its final size
+// without the writes that extended it. A truncation takes effect before the writes that follow it.
 
 namespace gatetest {
 
@@ -47,7 +47,9 @@ struct Writes {
 private:
     static constexpr std::size_t most = 10;  ///< the number of writes of which all subsets are tried
 
-    /** All subsets. Of many writes, only: the first ones, all without one, and each alone. Each is also there in part.
+    /**
+     * Returns all subsets of the writes; of more than `most` writes, only prefixes, all writes except one, and single
+     * writes. Also returns each of the latter with the one write half done.
      */
     std::vector<WrittenSizes> possible() const {
         std::vector<WrittenSizes> all;

@@ -55,7 +55,7 @@ struct OpenResults {
     }
 };
 
-/** Lets record files appear unreadable for lack of descriptors during its lifetime, except for the gate. */
+/** During its lifetime, only the gate can read record files, as if the provider had no free file descriptors. */
 struct UnreadableRecords {
     static inline int count = 0;
 
@@ -212,7 +212,7 @@ std::multiset<std::string> content(const Outcome& leases) {
     for (const Instance& instance : leases.instances()) {
         std::string text;
         for (const NamedValue& property : instance.properties) {
-            text += property.name + "=" + valueIn(instance, property.name).value_or("(null)") + ";";
+            text += property.name.string() + "=" + valueIn(instance, property.name).value_or("(null)") + ";";
         }
         shown.insert(text);
     }

@@ -90,7 +90,7 @@ TEST(WrappedBrokerTest, EveryMemoryFunctionIsForwarded) {
                     &T::freeDateTime, &T::freeSelectExp>(memory, manager, &CMPIBroker::mft);
 }
 
-TEST(WrappedBrokerTest, FunctionsThatTheManagerLacksAreLacking) {
+TEST(WrappedBrokerTest, FunctionsThatTheManagerLacksAreNull) {
     CMPIBrokerFT services{};
     expectMissing<&CMPIBrokerFT::enumerateInstances, &CMPIBrokerFT::getProperty>(&CMPIBroker::bft, services);
     CMPIBrokerEncFT makers{};

@@ -32,6 +32,10 @@ def name_of(class_name, identifier):
             f'{identifier}</KEYVALUE></KEYBINDING></INSTANCENAME>')
 
 
+def value_parameter(parameter, value):
+    return f'<IPARAMVALUE NAME="{parameter}"><VALUE>{value}</VALUE></IPARAMVALUE>'
+
+
 def path_parameter(parameter, class_name, identifier):
     return f'<IPARAMVALUE NAME="{parameter}">{name_of(class_name, identifier)}</IPARAMVALUE>'
 
@@ -53,7 +57,39 @@ def headers_for(operation, namespace="root/cimv2", **changed):
     return {name: value for name, value in headers.items() if value is not None}
 
 
-class CimServer:
+class Client:
+    """Sends requests to a server, whose certificate it does not check."""
+
+    def __init__(self, host, port, tls=False):
+        self.host, self.port, self.tls = host, port, tls
+        self.context = ssl.create_default_context()
+        self.context.check_hostname = False
+        self.context.verify_mode = ssl.CERT_NONE
+
+    def connection(self):
+        if self.tls:
+            return http.client.HTTPSConnection(self.host, self.port, timeout=30, context=self.context)
+        return http.client.HTTPConnection(self.host, self.port, timeout=30)
+
+    def send(self, body, headers, method="POST", connection=None):
+        """Returns status, headers and body of the response."""
+        used = connection or self.connection()
+        used.request(method, "/cimom", body.encode() if isinstance(body, str) else body, headers)
+        response = used.getresponse()
+        content = response.read()
+        if connection is None:
+            used.close()
+        return response.status, response.headers, content
+
+    def ask(self, operation, parameters="", namespace="root/cimv2", connection=None, **changed):
+        """Returns the element IMETHODRESPONSE of an operation."""
+        status, _, content = self.send(call(operation, parameters, namespace),
+                                       headers_for(operation, namespace, **changed), connection=connection)
+        assert status == 200, (status, content)
+        return xml.fromstring(content).find("MESSAGE/SIMPLERSP/IMETHODRESPONSE")
+
+
+class CimServer(Client):
     """A server with the gate, or with other providers, until it is left.
 
     @param environment  with the agent and the programs
@@ -69,10 +105,7 @@ class CimServer:
         self.log = environment.directory / "serve.log"
         self.command = [str(word) for word in ("cimhost", *provider, "serve", *listen, *options)]
         self.environment = environment.environment
-        self.tls = tls
-        self.context = ssl.create_default_context()
-        self.context.check_hostname = False
-        self.context.verify_mode = ssl.CERT_NONE
+        super().__init__("127.0.0.1", None, tls)
 
     def __enter__(self):
         with open(self.log, "ab") as log:
@@ -94,28 +127,6 @@ class CimServer:
         """Returns the exit status."""
         self.process.send_signal(signal.SIGTERM)
         return self.process.wait(60)
-
-    def connection(self):
-        if self.tls:
-            return http.client.HTTPSConnection("127.0.0.1", self.port, timeout=30, context=self.context)
-        return http.client.HTTPConnection("127.0.0.1", self.port, timeout=30)
-
-    def send(self, body, headers, method="POST", connection=None):
-        """Returns status, headers and body of the response."""
-        used = connection or self.connection()
-        used.request(method, "/cimom", body, headers)
-        response = used.getresponse()
-        content = response.read()
-        if connection is None:
-            used.close()
-        return response.status, response.headers, content
-
-    def ask(self, operation, parameters="", namespace="root/cimv2", connection=None, **changed):
-        """Returns the element IMETHODRESPONSE of an operation."""
-        status, _, content = self.send(call(operation, parameters, namespace),
-                                       headers_for(operation, namespace, **changed), connection=connection)
-        assert status == 200, (status, content)
-        return xml.fromstring(content).find("MESSAGE/SIMPLERSP/IMETHODRESPONSE")
 
     def raw(self, data):
         """Sends bytes and returns all that the server answers until it closes the connection or stays silent."""

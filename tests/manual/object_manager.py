@@ -1,7 +1,7 @@
 """A stand-in for an object manager: cimhost-lab performs each request, with the gate or without it, as SFCB would.
 
-Implements CIM-XML over HTTP as far as the documents' clients need it. The module pywbem of stand-ins/ implements the
-calls of the documents' Python client with it.
+Implements CIM-XML over HTTP as far as the documents' clients need it. The module stand-ins/pywbem
+calls it for the documents' Python client.
 """
 
 import contextlib

@@ -22,7 +22,7 @@ using LeaseRow = PropertyRow<Lease, LeaseUnit, Value>;
 template <class Value>
 using WarrantyRow = PropertyRow<Warranty, WarrantyUnit, Value>;
 
-const LeaseRow<std::string> leaseTexts[] = {
+const LeaseRow<std::string> leaseStrings[] = {
     {"Lessor", &Lease::getLessor, &Lease::setLessor, &LeaseUnit::Lessor},
     {"BaseTermCommencementDate", &Lease::getBaseTermCommencementDate, &Lease::setBaseTermCommencementDate,
      &LeaseUnit::BaseTermCommencementDate},
@@ -45,7 +45,7 @@ const LeaseRow<bool> leaseFlags[] = {
     {"BargainRenewalOption", &Lease::getBargainRenewalOption, &Lease::setBargainRenewalOption,
      &LeaseUnit::BargainRenewalOption},
 };
-const WarrantyRow<std::string> warrantyTexts[] = {
+const WarrantyRow<std::string> warrantyStrings[] = {
     {"Warrantor", &Warranty::getWarrantor, &Warranty::setWarrantor, &WarrantyUnit::Warrantor},
     {"CommencementDate", &Warranty::getCommencementDate, &Warranty::setCommencementDate,
      &WarrantyUnit::CommencementDate},
@@ -91,7 +91,7 @@ using LeaseProperties = RecordProperties<LeaseElementKind>;
 using WarrantyProperties = RecordProperties<WarrantyElementKind>;
 
 TEST_F(LeaseProperties, HaveTheirOwnAccessors) {
-    for (const auto& row : leaseTexts) {
+    for (const auto& row : leaseStrings) {
         expectProperty(row, std::string("some text"));
     }
     for (const auto& row : leaseNumbers) {
@@ -103,7 +103,7 @@ TEST_F(LeaseProperties, HaveTheirOwnAccessors) {
 }
 
 TEST_F(WarrantyProperties, HaveTheirOwnAccessors) {
-    for (const auto& row : warrantyTexts) {
+    for (const auto& row : warrantyStrings) {
         expectProperty(row, std::string("some text"));
     }
     for (const auto& row : warrantyNumbers) {
@@ -115,7 +115,7 @@ TEST_F(LeaseProperties, AreReadBackFromTheFile) {
     fill({"lease 1"});
     {
         Lease lease;
-        for (const auto& row : leaseTexts) {
+        for (const auto& row : leaseStrings) {
             (lease.*row.set)(std::string("long-enough-for-a-date-of-") + row.name);
         }
         for (const auto& row : leaseNumbers) {
@@ -128,7 +128,7 @@ TEST_F(LeaseProperties, AreReadBackFromTheFile) {
     const LeaseCache reloaded;
     const LeaseUnit& unit = reloaded.table.at(0);
     EXPECT_EQ(LeaseKind::members(unit), LeaseKind::members(table().at(0)));
-    for (const auto& row : leaseTexts) {
+    for (const auto& row : leaseStrings) {
         EXPECT_EQ(unit.*row.member, std::string("long-enough-for-a-date-of-") + row.name);
     }
 }

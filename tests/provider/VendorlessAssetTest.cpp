@@ -24,7 +24,7 @@ protected:
 };
 
 TEST_F(VendorlessAsset, PassesEveryVendorFilter) {
-    for (const char* vendor : {"Computer Maker", "anybody", ""}) {
+    for (const char* vendor : {"Computer Maker", "another maker", ""}) {
         AssetIDDetails element;
         element.setFilter(AssetIDDetails::FILTER_VENDOR, vendor);
         EXPECT_TRUE(hasCurrent(element)) << vendor;
@@ -34,7 +34,7 @@ TEST_F(VendorlessAsset, PassesEveryVendorFilter) {
 
 TEST_F(VendorlessAsset, FailsOtherFilters) {
     AssetIDDetails element;
-    element.setFilter(AssetIDDetails::FILTER_VENDOR, "anybody");
+    element.setFilter(AssetIDDetails::FILTER_VENDOR, "another maker");
     element.setFilter(AssetIDDetails::FILTER_NAME, "otherhost");
     EXPECT_FALSE(hasCurrent(element));
 }

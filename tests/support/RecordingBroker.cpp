@@ -184,7 +184,7 @@ CMPIObjectPath* RecordingBroker::objectPath(const cimhost::ObjectPath& path) {
 }
 
 CMPIInstance* RecordingBroker::instance(const cimhost::Instance& instance) {
-    return state->objects.make<CMPIInstance>({cimhost::SharedInstance(instance)});
+    return state->objects.make<CMPIInstance>({instance});
 }
 
 void RecordingBroker::emulate(Manager manager) {

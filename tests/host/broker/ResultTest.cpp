@@ -30,7 +30,7 @@ TEST_F(ResultTest, CollectsEverythingInOrder) {
     result->ft->returnDone(result);
     result->ft->returnDone(result);
     ASSERT_EQ(events.size(), 6U);
-    EXPECT_EQ(std::get<ObjectPath>(events[0]).className, "P");
+    EXPECT_EQ(cimhost::resultOf<ObjectPath>(events[0])->className, "P");
     EXPECT_EQ(resultOf<Instance>(events[1])->path.className, "I");
     EXPECT_EQ(std::get<std::uint32_t>(std::get<Value>(events[2]).single), 7U);
     EXPECT_EQ(resultOf<ErrorInfo>(events[3])->message, "It broke");

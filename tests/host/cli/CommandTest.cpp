@@ -70,7 +70,7 @@ TEST(CreateInstance, GivesTheProviderKeysAndValues) {
 )"));
 }
 
-TEST(CreateInstance, AKeyMayStandInThePathOrAmongTheValues) {
+TEST(CreateInstance, AKeyMayBeInThePathOrAmongTheValues) {
     EXPECT_EQ(run({"ci", "Test_Box", "Name=new"}).output, "root/cimv2:Test_Box.Name=\"new\"\n");
     EXPECT_EQ(run({"ci", "Test_Box.Name=\"new\"", "Name=new"}).status, 0);
     const ProgramResult different = run({"ci", "Test_Box.Name=\"new\"", "Name=old"});

@@ -14,7 +14,7 @@ constexpr auto accented = "e\u0301";      // a letter and the accent above it
 constexpr auto composed = "\u00E9";       // the same in one
 constexpr auto broken = "\xE6\x97 \xFF";  // an incomplete character, a blank, an invalid byte
 
-TEST(Columns, AreThoseThatATerminalGives) {
+TEST(Columns, AreThoseOfTheTerminal) {
     EXPECT_EQ(columnsOf(""), 0U);
     EXPECT_EQ(columnsOf("abc"), 3U);
     EXPECT_EQ(columnsOf(wide), 4U);

@@ -46,7 +46,7 @@ TEST_F(ObjectManagerTest, CreateInstanceMustReturnSomething) {
     EXPECT_THAT(created.status.message, testing::HasSubstr("returned neither a path nor an instance"));
 }
 
-TEST_F(ObjectManagerTest, CreateHandsOverKeysThenProperties) {
+TEST_F(ObjectManagerTest, CreatePassesKeysThenProperties) {
     Instance given;
     given.properties = {testsupport::named("Colour", text("red"))};
     ASSERT_TRUE(manager().perform(Request::createInstance(named("Sample_Thing", "d"), given)).ok());
@@ -54,7 +54,7 @@ TEST_F(ObjectManagerTest, CreateHandsOverKeysThenProperties) {
     EXPECT_EQ(stringOf(found.instance().properties, "Text"), "Name=d;Colour=red;");
 }
 
-TEST_F(ObjectManagerTest, CreateHandsOverNoKeyTwice) {
+TEST_F(ObjectManagerTest, CreatePassesNoKeyTwice) {
     Instance given;
     given.properties = {testsupport::named("Colour", text("red")), testsupport::named("NAME", text("e"))};
     ASSERT_TRUE(manager().perform(Request::createInstance(named("Sample_Thing", "e"), given)).ok());
@@ -62,7 +62,7 @@ TEST_F(ObjectManagerTest, CreateHandsOverNoKeyTwice) {
     EXPECT_EQ(stringOf(found.instance().properties, "Text"), "Colour=red;NAME=e;");
 }
 
-TEST_F(ObjectManagerTest, ModifyHandsOverExactlyTheProperties) {
+TEST_F(ObjectManagerTest, ModifyPassesExactlyTheProperties) {
     create("Sample_Thing", "f");
     Instance given;
     given.properties = {testsupport::named("Colour", text("blue"))};
@@ -196,7 +196,7 @@ TEST_F(ObjectManagerTest, AFailingUpCallReturnsItsStatus) {
 
 // Associations.
 
-TEST_F(ObjectManagerTest, AssociationsGoByTheirClass) {
+TEST_F(ObjectManagerTest, AnAssociationClassSelectsItsProvider) {
     const cimhost::AssociationFilter filter{"sample_link", "Far", "Here", std::nullopt};
     const auto found = manager().perform(Request::associators(named("Sample_Thing", "x"), filter));
     ASSERT_EQ(found.instances.size(), 1U) << found.status.message;

@@ -13,7 +13,7 @@ constexpr auto classes = R"(
 std::string listOf(const Instance& instance) {
     std::string text;
     for (const NamedValue& property : instance.properties) {
-        text += property.name + "=" + formatMof(property.value) + ";";
+        text += property.name.string() + "=" + formatMof(property.value) + ";";
     }
     return text;
 }

@@ -16,7 +16,7 @@ TEST(MofReader, NothingAndCommentsDeclareNothing) {
     EXPECT_TRUE(schemaOf("\xEF\xBB\xBF// after a byte order mark").classes().empty());
 }
 
-TEST(MofReader, CommentsMayStandBetweenAnyTwoTokens) {
+TEST(MofReader, CommentsMaySeparateAnyTwoTokens) {
     const Schema schema = schemaOf("/**/[/**/Key/**/]//\nclass/**/C/**/{/**/[Key]string/**/K/*;*/;/**/}/**/;");
     EXPECT_TRUE(schema.findClass("C")->findProperty("K")->isKey());
 }

@@ -105,6 +105,15 @@ TEST_F(HeaderCheckTest, ProtocolVersionsAndGroupsOfTheFutureAreRefused) {
     EXPECT_EQ(with("CIMBatch", "").with("CIMExport", "x").result(), "501 unsupported-operation");
 }
 
+TEST_F(HeaderCheckTest, HeadersThatAreThereTwiceAreRefused) {
+    with("CIMProtocolVersion", "1.0");
+    request.headers.emplace("CIMProtocolVersion", "2.0");
+    EXPECT_EQ(result(), "400 unsupported-protocol-version");
+    with("CIMProtocolVersion", "").with("Content-Encoding", "identity");
+    request.headers.emplace("Content-Encoding", "gzip");
+    EXPECT_EQ(result(), "415");
+}
+
 TEST_F(HeaderCheckTest, OnlyXmlInUtf8IsAccepted) {
     for (const char* type : {"text/xml", "application/xml", "TEXT/XML; charset=UTF-8", "text/xml;charset=utf-8"}) {
         EXPECT_EQ(with("Content-Type", type).result(), "200") << type;
@@ -113,6 +122,28 @@ TEST_F(HeaderCheckTest, OnlyXmlInUtf8IsAccepted) {
         EXPECT_EQ(with("Content-Type", type).result(), "415") << type;
     }
     EXPECT_EQ(with("Content-Type", "text/xml").with("Content-Encoding", "gzip").result(), "415");
+}
+
+TEST_F(HeaderCheckTest, HeadsThatOtherSoftwareReadsDifferentlyAreRefused) {
+    const HttpRequest accepted = request;
+    for (const auto& [name, value] : {std::pair{"Content-Length ", "100"},
+                                      {"Content-Length", "100"},
+                                      {"Host", "localhost"},
+                                      {"Transfer-Encoding", "chunked"},
+                                      {"X", "a\rTransfer-Encoding: chunked"}}) {
+        request.headers.emplace(name, value);
+        EXPECT_EQ(result(), "400") << name << ": " << value;
+        EXPECT_TRUE(mayHaveBody(request.headers)) << name << ": " << value;
+        request = accepted;
+    }
+    with("Content-Length", "");
+    for (const char* encoding : {"identity", "gzip, chunked", "chunked, identity", "xchunked"}) {
+        EXPECT_EQ(with("Transfer-Encoding", encoding).result(), "400") << encoding;
+    }
+    EXPECT_EQ(with("Transfer-Encoding", "Chunked").result(), "200");
+    request.method = "OPTIONS";
+    request.headers.emplace("Transfer-Encoding", "chunked");
+    EXPECT_EQ(result(), "400");
 }
 
 TEST_F(HeaderCheckTest, TheLengthIsLimitedAndUnambiguous) {

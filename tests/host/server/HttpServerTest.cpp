@@ -3,6 +3,7 @@
 
 #include <future>
 #include <list>
+#include <map>
 
 #include "ServerFixture.h"
 #include "TcpPair.h"
@@ -156,6 +157,28 @@ TEST_F(HttpServerTest, AFloodOfSlowReadersLeavesOthersServed) {
     EXPECT_THAT(response, StartsWith("HTTP/1.1 200 "));
 }
 
+TEST_F(HttpServerTest, ALongResponseWaitsForSlowReadersUntilTheyAreEnded) {
+    settings.limits.responseResults = 2'000;
+    settings.limits.queueTime = 1h;
+    manager.answerWith([](const Request&) { return largeResponse(); });
+    const Socket slow = slowReader();
+    const Socket other = slowReader();  // its response begins after the other has ended
+    slow.receive();
+}
+
+TEST_F(HttpServerTest, ResultsThatClientsHaveNotReceivedAreLimited) {
+    settings.limits.responseResults = 2'000;
+    settings.limits.queueTime = 0s;
+    manager.answerWith([](const Request&) { return largeResponse(); });
+    const Socket slow = slowReader();
+    const Socket refused = connect();
+    refused.send(requestOf(reader));
+    EXPECT_THAT(refused.receiveUntil("have not received their results yet.\n"),
+                testing::AllOf(StartsWith("HTTP/1.1 503 "), HasSubstr("Retry-After: 5\r\n")));
+    manager.answerWith([](const Request&) { return Response{}; });
+    EXPECT_THAT(served(refused), StartsWith("HTTP/1.1 200 "));
+}
+
 TEST_F(HttpServerTest, AMissingPasswordIsRefusedBeforeTheBodyArrives) {
     const Socket client = connect();
     client.send(requestOf("", false));
@@ -176,6 +199,54 @@ TEST_F(HttpServerTest, ARefusalReachesAClientThatSendsItsBodyFirst) {
     }
 }
 
+TEST_F(HttpServerTest, ARequestWhoseEndIsAmbiguousIsRefusedAndEndsTheConnection) {
+    const std::string request = requestOf(reader);
+    const std::size_t size = request.size() - request.find("\r\n\r\n") - 4;
+    const std::string length = std::to_string(size);
+    std::map<std::string, Socket> clients;
+    settings.limits.connections = settings.limits.connectionsPerAddress = 20;
+    for (const std::string& headers : std::vector<std::string>{
+             "Content-Length: " + length + "\r\nContent-Length: " + length,
+             "Content-Length: " + length + "\r\nContent-Length: 0",
+             "Content-Length: " + length + ", " + length,
+             "Content-Length: +" + length,
+             "Content-Length: 0x10",
+             "Content-Length:",
+             "Content-Length:\r\n " + length,
+             "Content-Length : " + length,
+             "Content-Length: " + length + "\r\nTransfer-Encoding: chunked",
+             "Content-Length: " + length + "\r\nTransfer-Encoding : chunked",
+             "Content-Length: " + length + "\r\nHost: localhost",
+             "Transfer-Encoding: chunked\r\nTransfer-Encoding: identity",
+             "Transfer-Encoding: gzip, chunked",
+             "Transfer-Encoding: xchunked",
+         }) {
+        std::string ambiguous = request;
+        const std::size_t at = ambiguous.find("Content-Length");
+        ambiguous.replace(at, ambiguous.find("\r\n", at) - at, headers);
+        const Socket& client = clients.emplace(headers, connect()).first->second;
+        client.send(ambiguous);
+        client.send(request);
+    }
+    for (const auto& [headers, client] : clients) {
+        const std::string received = client.receive();
+        EXPECT_THAT(received, StartsWith("HTTP/1.1 400 ")) << headers;
+        EXPECT_THAT(received, testing::Not(HasSubstr("HTTP/1.1 2"))) << headers;
+    }
+}
+
+TEST_F(HttpServerTest, HeadsThatAreTooLongAreRefusedAndLogged) {
+    const std::string tooLong(100'000, 'a');
+    for (const auto& [head, status] : {std::pair<std::string, std::string>{"POST /" + tooLong + " HTTP/1.1\r\n", "414"},
+                                       {"POST / HTTP/1.1\r\nX: " + tooLong + "\r\n", "431"}}) {
+        const Socket client = connect();
+        client.send(head + "Host: localhost\r\n\r\n");
+        EXPECT_THAT(client.receive(), StartsWith("HTTP/1.1 " + status));
+    }
+    running.reset();
+    EXPECT_THAT(log(), testing::MatchesRegex("([^\n]* - - - 400/0 0 0.000\n){2}"));
+}
+
 TEST_F(HttpServerTest, IdleConnectionsEnd) {
     settings.limits.idleTime = 1s;
     const Socket client = connect();
@@ -193,6 +264,26 @@ TEST_F(HttpServerTest, ARequestThatWaitsTooLongForOthersIsRefused) {
                 testing::AllOf(StartsWith("HTTP/1.1 503 "), HasSubstr("Retry-After: 5\r\n")));
     EXPECT_THAT(other.finish(), StartsWith("HTTP/1.1 200 "));
     EXPECT_THAT(served(connect()), StartsWith("HTTP/1.1 200 "));
+}
+
+TEST_F(HttpServerTest, APasswordThatWaitsTooLongForOthersIsNotChecked) {
+    settings.limits.queueTime = 0s;
+    std::promise<void> begun;
+    std::promise<void> finished;
+    authenticator.beforeAnswer = [&, isFinished = finished.get_future().share()] {
+        begun.set_value();
+        isFinished.wait();
+    };
+    const Socket first = connect();
+    first.send(requestOf(reader));
+    begun.get_future().wait();
+    const Socket second = connect();
+    second.send(requestOf(writer));
+    EXPECT_THAT(second.receiveUntil("too many passwords to check.\n"),
+                testing::AllOf(StartsWith("HTTP/1.1 503 "), HasSubstr("Retry-After: 5\r\n")));
+    EXPECT_EQ(authenticator.asked, 1);
+    finished.set_value();
+    EXPECT_THAT(first.receiveUntil("</CIM>\n"), StartsWith("HTTP/1.1 200 "));
 }
 
 TEST_F(HttpServerTest, ARequestWaitsForOthersAtWork) {

@@ -24,9 +24,9 @@ protected:
             return "ended";
         }
         const Reply reply = handler().finish(exchange);
-        const auto* text = std::get_if<std::shared_ptr<cimxml::ResponseText>>(&reply);
-        return text == nullptr ? std::to_string(std::get<HttpResponse>(reply).status)
-                               : "200/" + std::to_string((*text)->status());
+        const auto* performed = std::get_if<CimReply>(&reply);
+        return performed == nullptr ? std::to_string(std::get<HttpResponse>(reply).status)
+                                    : "200/" + std::to_string(performed->text->status());
     }
 
     std::string list(const std::string& authorization) {
@@ -138,10 +138,16 @@ TEST_F(RequestHandlerTest, BodiesThatAreTooLargeAreIgnoredUpToALimit) {
     EXPECT_EQ(status(head("EnumerateInstanceNames", reader), std::string(8001, ' ')), "ended");
 }
 
-TEST_F(RequestHandlerTest, RequestsWithoutASlotAreUnavailable) {
-    settings.limits.requestsAtWork = 0;
+TEST_F(RequestHandlerTest, RequestsAtWorkAreLimited) {
+    settings.limits.requestsAtWork = 1;
     settings.limits.queueTime = std::chrono::seconds(0);
-    EXPECT_EQ(list(reader), "503");
+    std::string during;
+    manager.answerWith([&](const Request&) {
+        during = list(reader);
+        return Response{};
+    });
+    EXPECT_EQ(list(reader), "200/0");
+    EXPECT_EQ(during, "503");
 }
 
 TEST_F(RequestHandlerTest, AServerThatStopsAcceptsNoRequests) {

@@ -19,9 +19,11 @@ class FakeAuthenticator : public Authenticator {
 public:
     bool accepts(const Credentials& credentials) override {
         ++asked;
+        beforeAnswer();
         return credentials.password == "right";
     }
     std::atomic<int> asked = 0;
+    std::function<void()> beforeAnswer = [] {};
 };
 
 /** Keeps the principal of the last request, and answers with a function. */

@@ -68,6 +68,9 @@ head_seconds = 3
 open_enumerations = 5
 enumeration_results = 6
 enumeration_seconds = 20
+enumeration_default_seconds = 10
+pull_objects = 8
+response_results = 9
 failure_milliseconds = 0
 )");
     ASSERT_EQ(settings.listeners.size(), 2U);
@@ -81,6 +84,9 @@ failure_milliseconds = 0
     EXPECT_EQ(settings.limits.enumerations.open, 5U);
     EXPECT_EQ(settings.limits.enumerations.results, 6U);
     EXPECT_EQ(settings.limits.enumerations.longestTimeout.count(), 20);
+    EXPECT_EQ(settings.limits.enumerations.timeout.count(), 10);
+    EXPECT_EQ(settings.limits.enumerations.mostObjects, 8U);
+    EXPECT_EQ(settings.limits.responseResults, 9U);
     EXPECT_EQ(settings.limits.failureDelay.count(), 0);
 }
 

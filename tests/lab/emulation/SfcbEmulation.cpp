@@ -32,7 +32,7 @@ std::size_t xmlSize(const Scalar& value) {
 std::size_t xmlSize(const std::vector<NamedValue>& values) {
     std::size_t size = 0;
     for (const NamedValue& each : values) {
-        size += markup + each.name.size();
+        size += markup + each.name.string().size();
         for (const Scalar& element : each.value.elements()) {
             size += xmlSize(element);
         }
@@ -44,7 +44,7 @@ std::size_t xmlSize(const std::vector<NamedValue>& values) {
 std::size_t xmlSize(const ResultEvents& events) {
     std::size_t size = 0;
     for (const ResultEvent& event : events) {
-        if (const auto* path = std::get_if<ObjectPath>(&event)) {
+        if (const auto* path = resultOf<ObjectPath>(event)) {
             size += xmlSize(*path);
         } else if (const auto* instance = resultOf<Instance>(event)) {
             size += xmlSize(instance->path) + xmlSize(instance->properties);
@@ -55,7 +55,7 @@ std::size_t xmlSize(const ResultEvents& events) {
 
 bool returnedObject(const ProviderResponse& response) {
     return std::any_of(response.events.begin(), response.events.end(), [](const ResultEvent& event) {
-        return resultOf<Instance>(event) != nullptr || std::holds_alternative<ObjectPath>(event);
+        return resultOf<Instance>(event) != nullptr || resultOf<ObjectPath>(event) != nullptr;
     });
 }
 
@@ -157,7 +157,7 @@ public:
     /** An instance is misread as a path, with the namespace as its class. */
     StatusOr<ObjectPath> createdPath(const ProviderResponse& response) const override {
         const auto first = std::find_if(response.events.begin(), response.events.end(), [](const ResultEvent& each) {
-            return resultOf<Instance>(each) != nullptr || std::holds_alternative<ObjectPath>(each);
+            return resultOf<Instance>(each) != nullptr || resultOf<ObjectPath>(each) != nullptr;
         });
         const auto* instance = first == response.events.end() ? nullptr : resultOf<Instance>(*first);
         return instance == nullptr

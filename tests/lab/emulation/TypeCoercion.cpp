@@ -88,14 +88,15 @@ bool hasInvalidDateTime(const Value& value) {
 
 Status refuseStringForNumber(NamedValue& sent, const PropertyInfo& property) {
     return sent.value.type == CMPI_string && isNumber(property.type)
-               ? crashed("a text was sent for the number " + sent.name + ".")
+               ? crashed("a text was sent for the number " + sent.name.string() + ".")
                : Status{};
 }
 
 Status coerce(NamedValue& sent, const PropertyInfo& property) {
     const Value& value = sent.value;
     if (hasInvalidDateTime(value)) {
-        return {CMPI_RC_ERR_INVALID_PARAMETER, "The property " + sent.name + " has a datetime that does not exist."};
+        return {CMPI_RC_ERR_INVALID_PARAMETER,
+                "The property " + sent.name.string() + " has a datetime that does not exist."};
     }
     const bool isOther = value.type != property.type || value.isArray != property.isArray;
     return isOther ? convert(sent, property) : Status{};

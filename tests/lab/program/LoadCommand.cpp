@@ -95,7 +95,7 @@ void addLoadCommand(CLI::App& app, LoadArguments& load) {
                     "create=20,modify=25,delete=15,enumerate=5,get=35, and associate=5 with --source")
         ->type_name("NAME=WEIGHT,...");
     sub->add_option("--source", load.source, "Instance whose associations are requested")->type_name("PATH");
-    sub->add_option("--assoc-class", load.associationClass, "Association to follow from there")->type_name("CLASS");
+    sub->add_option("--assoc-class", load.associationClass, "Association to follow from it")->type_name("CLASS");
     sub->add_flag("--fill", load.fills, "Create instances with values, and expect these values");
     sub->add_flag("--keep", load.keeps, "Do not delete the instances at the end");
     sub->add_flag("--no-probes", load.isTrusting, "Do not request missing instances or create existing ones");

@@ -67,7 +67,7 @@ TEST_F(EmulationLoadingTest, RegisteredInterfacesMustExistAtOnceOrWhenTheyAreReq
     EXPECT_THAT(errorOf(Manager::sfcb, "Other_Both"), HasSubstr("neither Anything_Create_AssociationMI"));
 }
 
-TEST_F(EmulationLoadingTest, AnIdleLibraryIsUnloadedUnlessItAsksToStay) {
+TEST_F(EmulationLoadingTest, AnIdleLibraryIsUnloadedUnlessItRefuses) {
     for (const Manager each : cimhost::lab::everyManager) {
         EXPECT_THAT(errorOf(each, "Sample_Thing"), IsEmpty());
         EXPECT_TRUE(manager().perform(Request::enumerateInstances(classPath("Other_Thing"))).ok());
@@ -81,7 +81,7 @@ TEST_F(EmulationLoadingTest, AnIdleLibraryIsUnloadedUnlessItAsksToStay) {
     }
 }
 
-TEST_F(EmulationLoadingTest, AnIdleLibraryStaysIfOneInterfaceAsksOrIfAllDo) {
+TEST_F(EmulationLoadingTest, AnIdleLibraryStaysLoadedIfOneInterfaceOrAllRefuseToBeUnloaded) {
     add("Half_Thing", "Half", "OtherProvider", true, true);
     for (const auto& [each, starts] :
          {std::pair(Manager::standard, 1U), std::pair(Manager::sfcb, 1U), std::pair(Manager::openPegasus, 2U)}) {

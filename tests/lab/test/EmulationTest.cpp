@@ -367,7 +367,7 @@ TEST_F(EmulationTest, AnExceptionIsAFailureOrACrashOrUnknown) {
     EXPECT_EQ(thrown().message, "Unknown error.");
 }
 
-TEST_F(EmulationTest, FactoriesAreCalledOnceAProviderOrOnceAClass) {
+TEST_F(EmulationTest, FactoriesAreCalledOncePerProviderOrOncePerClass) {
     for (const auto& [each, calls] :
          {std::pair(Manager::standard, 1U), std::pair(Manager::sfcb, 2U), std::pair(Manager::openPegasus, 1U)}) {
         as(each);

@@ -5,7 +5,7 @@
 #include "lab/test/Inventory.h"
 #include "operations/LoadedLibrary.h"
 
-// Loads against providers that are right and providers that are wrong; the mismatch does not depend on luck.
+// Loads of correct and of defective providers. The mismatches are deterministic.
 
 namespace {
 

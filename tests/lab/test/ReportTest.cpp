@@ -17,7 +17,7 @@ WrongResponse wrong(std::optional<unsigned> client, std::size_t number, const ch
     return {client, number, "request", {kind, "this", "that"}};
 }
 
-TEST(Percentile, IsTheTimeThatSoManyDoNotExceed) {
+TEST(Percentile, IsTheTimeThatThisShareDoesNotExceed) {
     std::vector<Statistics::Time> times;
     EXPECT_EQ(percentile(times, 0.5), 0);
     for (int i = 1; i <= 200; ++i) {
