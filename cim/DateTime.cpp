@@ -1,10 +1,10 @@
 #include "cim/DateTime.h"
 
 #include <algorithm>
-#include <chrono>
 #include <cstdio>
 #include <ctime>
 #include <initializer_list>
+#include <optional>
 
 namespace cim {
 namespace {
@@ -71,29 +71,6 @@ bool isTimeOfDay(std::string_view string) {
            within(string.substr(4, 2), 0, 59);
 }
 
-constexpr std::int64_t microsecondsInSecond = 1'000'000;
-
-/** The value of a field of digits. */
-int field(std::string_view dateTime, std::size_t position, std::size_t length) {
-    return number(dateTime.substr(position, length)).value_or(0);
-}
-
-std::int64_t secondsOfInterval(std::string_view dateTime) {
-    const std::int64_t hours = std::int64_t{24} * field(dateTime, 0, 8) + field(dateTime, 8, 2);
-    return (60 * hours + field(dateTime, 10, 2)) * 60 + field(dateTime, 12, 2);
-}
-
-std::int64_t secondsOfTime(std::string_view dateTime) {
-    std::tm time{};
-    time.tm_year = field(dateTime, 0, 4) - 1900;
-    time.tm_mon = field(dateTime, 4, 2) - 1;
-    time.tm_mday = field(dateTime, 6, 2);
-    time.tm_hour = field(dateTime, 8, 2);
-    time.tm_min = field(dateTime, 10, 2);
-    time.tm_sec = field(dateTime, 12, 2);
-    return std::int64_t{timegm(&time)} - std::int64_t{dateTime[21] == '-' ? -60 : 60} * field(dateTime, 22, 3);
-}
-
 }  // namespace
 
 bool isDateTime(std::string_view string) {
@@ -139,45 +116,6 @@ std::string formatPointInTime(std::int64_t seconds, int offset, int microseconds
                       fields.tm_mon + 1, fields.tm_mday, fields.tm_hour, fields.tm_min, fields.tm_sec, microseconds,
                       offset < 0 ? '-' : '+', offset < 0 ? -offset : offset);
     return {string, static_cast<std::size_t>(length)};
-}
-
-bool isIntervalForm(std::string_view dateTime) {
-    return dateTime.size() == noDate.size() && dateTime[21] == ':';
-}
-
-std::optional<std::int64_t> microsecondsOf(std::string_view dateTime) {
-    if (dateTime.size() != noDate.size() || dateTime.find('*') != std::string_view::npos) {
-        return std::nullopt;
-    }
-    const std::int64_t seconds = isIntervalForm(dateTime) ? secondsOfInterval(dateTime) : secondsOfTime(dateTime);
-    return seconds * microsecondsInSecond + field(dateTime, 15, 6);
-}
-
-std::string formatTime(std::int64_t microseconds) {
-    std::int64_t fraction = microseconds % microsecondsInSecond;
-    if (fraction < 0) {
-        fraction += microsecondsInSecond;
-    }
-    const std::int64_t seconds = (microseconds - fraction) / microsecondsInSecond;
-    return formatPointInTime(seconds, 0, static_cast<int>(fraction));
-}
-
-std::string formatInterval(std::uint64_t microseconds) {
-    const std::uint64_t seconds = microseconds / microsecondsInSecond;
-    const std::uint64_t days = seconds / 86400;
-    if (days > 99'999'999) {
-        return {};
-    }
-    char formatted[64];
-    std::snprintf(formatted, sizeof formatted, "%08u%02u%02u%02u.%06u:000", static_cast<unsigned>(days),
-                  static_cast<unsigned>(seconds / 3600 % 24), static_cast<unsigned>(seconds / 60 % 60),
-                  static_cast<unsigned>(seconds % 60), static_cast<unsigned>(microseconds % microsecondsInSecond));
-    return formatted;
-}
-
-std::string formatCurrentTime() {
-    const auto now = std::chrono::system_clock::now().time_since_epoch();
-    return formatTime(std::chrono::duration_cast<std::chrono::microseconds>(now).count());
 }
 
 }  // namespace cim

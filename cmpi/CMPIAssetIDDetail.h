@@ -14,6 +14,7 @@ struct AssetAdapterTraits {
     using Element = AssetIDDetails;
     static constexpr const char* className = "VELKO_AssetIDDetails";
     static constexpr const char* constructor = "CMPIAssetIDDetail";
+    static constexpr const char* destructor = "~CMPIAssetIDDetail";
 
     static const TraceSource traceSource;
     static const std::array<KeyRow<AssetIDDetails>, 4> keys;

@@ -13,6 +13,7 @@ struct LeaseAdapterTraits {
     using Element = Lease;
     static constexpr const char* className = "VELKO_Lease";
     static constexpr const char* constructor = "CMPILease";
+    static constexpr const char* destructor = "~CMPILease";
     static constexpr bool tracesCreation = true;
     static constexpr const char* modifyPropertiesLabel = " properties";
 

@@ -16,6 +16,7 @@ struct LeaseSettingAdapterTraits {
     static constexpr unsigned int associationClassId = ClassId::leaseSetting;
     static constexpr unsigned int elementClassId = ClassId::lease;
     static constexpr const char* constructor = "CMPILeaseSetting";
+    static constexpr const char* destructor = "~CMPILeaseSetting";
     static constexpr const char* locate = "locateLease";
 
     static const TraceSource traceSource;

@@ -14,6 +14,7 @@ struct AgentAdapterTraits {
     using Element = OstrelAgent;
     static constexpr const char* className = "VELKO_OstrelAgent";
     static constexpr const char* constructor = "CMPIOstrelAgent";
+    static constexpr const char* destructor = "~CMPIOstrelAgent";
 
     static const TraceSource traceSource;
     static const std::array<KeyRow<OstrelAgent>, 5> keys;

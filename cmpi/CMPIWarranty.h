@@ -13,6 +13,7 @@ struct WarrantyAdapterTraits {
     using Element = Warranty;
     static constexpr const char* className = "VELKO_Warranty";
     static constexpr const char* constructor = "CMPIWarranty";
+    static constexpr const char* destructor = "~CMPIWarranty";
     static constexpr bool tracesCreation = false;
     static constexpr const char* modifyPropertiesLabel = " properties=";
 

@@ -16,6 +16,7 @@ struct WarrantySettingAdapterTraits {
     static constexpr unsigned int associationClassId = ClassId::warrantySetting;
     static constexpr unsigned int elementClassId = ClassId::warranty;
     static constexpr const char* constructor = "CMPIWarrantySetting";
+    static constexpr const char* destructor = "~CMPIWarrantySetting";
     static constexpr const char* locate = "locateWarranty";
 
     static const TraceSource traceSource;

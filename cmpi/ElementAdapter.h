@@ -12,7 +12,7 @@ namespace KO::LeaseWarrantyProvider {
  * Adapter is the derived class. Its narrow(element, path) sets the element's filters from the path's keys; its
  * getObjectPath() returns the path of the current instance.
  *
- * Traits defines Element, traceSource, properties, and the name of the constructor in the log.
+ * Traits defines Element, traceSource, properties, and the names of the constructor and the destructor in the log.
  */
 template <class Adapter, class Traits>
 class ElementAdapter {

@@ -5,7 +5,6 @@
 #include <utility>
 
 #include "ElementAdapter.h"
-#include "FixedString.h"
 #include "KO/ProviderUtilities.h"
 #include "PropertyTable.h"
 #include "Trace.h"
@@ -31,7 +30,7 @@ ElementAdapter<Adapter, Traits>::ElementAdapter(const CMPIBroker* requestBroker,
 
 template <class Adapter, class Traits>
 ElementAdapter<Adapter, Traits>::~ElementAdapter() noexcept(false) {
-    const Traced traced(at(Traits::traceSource, Level::flow, destructorName<Traits>));
+    const Traced traced(at(Traits::traceSource, Level::flow, Traits::destructor));
 }
 
 template <class Adapter, class Traits>

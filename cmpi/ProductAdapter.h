@@ -38,7 +38,7 @@ struct KeyFilter {
  * Traits defines:
  *   Element              the managed element
  *   className            the CIM class
- *   constructor          its name in the log
+ *   constructor, destructor   their names in the log
  *   traceSource          trace source
  *   keys                 table of KeyRow, in the order of a path's keys
  *   filters              table of KeyFilter, in the order in which a path's keys are compared

@@ -13,7 +13,7 @@ namespace KO::LeaseWarrantyProvider {
  * Traits defines:
  *   Element                      the managed element
  *   className                    the CIM class
- *   constructor                  its name in the log
+ *   constructor, destructor      their names in the log
  *   tracesCreation               whether a successful creation is traced
  *   modifyPropertiesLabel        label of the property list in the trace of a modification
  *   traceSource, properties      trace source and table of PropertyRow of the class

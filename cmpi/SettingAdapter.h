@@ -5,7 +5,6 @@
 #include <string>
 
 #include "CMPIComputerSystem.h"
-#include "KO/ClassIds.h"
 
 namespace KO::LeaseWarrantyProvider {
 
@@ -23,7 +22,7 @@ namespace KO::LeaseWarrantyProvider {
  *   Element, Setting                    adapter of the lease or warranty, and element of the association
  *   associationClass, elementClass      the CIM classes
  *   associationClassId, elementClassId  their class ids
- *   constructor, locate                 names in the log; locateElement is traced as `locate`
+ *   constructor, destructor, locate     names in the log; locateElement is traced as `locate`
  *   traceSource                         trace source
  *   elementMoniker(setting, moniker)    translates a computer's moniker to that of its lease or warranty
  */
@@ -76,13 +75,9 @@ protected:
     CMPIObjectPath* locateElement(const CMPIObjectPath* computerPath);
 
 private:
-    /** @name Class of the request's path; all false for a class without results */
-    ///@{
-    bool isFromComputer() const { return requestedClassId == ClassId::computerSystem; }
-    bool isFromElement() const { return requestedClassId == Traits::elementClassId; }
-    bool isAssociationList() const { return requestedClassId == Traits::associationClassId; }
-    ///@}
+    enum class Mode { computerSource, elementSource, associationList, inert };
 
+    Mode mode() const;
     void position(const CMPIObjectPath* path);
 
     template <class Translate>

@@ -3,7 +3,7 @@
 // Definitions of SettingAdapter. Included only by the source file of each adapter, so that its code and trace buffers
 // belong to that translation unit.
 
-#include "FixedString.h"
+#include "KO/ClassIds.h"
 #include "KO/Moniker.h"
 #include "KO/ProviderUtilities.h"
 #include "SettingAdapter.h"
@@ -36,44 +36,74 @@ SettingAdapter<Traits>::SettingAdapter(const CMPIBroker* requestBroker, const CM
 
 template <class Traits>
 SettingAdapter<Traits>::~SettingAdapter() noexcept(false) {
-    traceMethod(at(Traits::traceSource, Level::flow, destructorName<Traits>));
+    traceMethod(at(Traits::traceSource, Level::flow, Traits::destructor));
+}
+
+template <class Traits>
+typename SettingAdapter<Traits>::Mode SettingAdapter<Traits>::mode() const {
+    switch (requestedClassId) {
+        case ClassId::computerSystem:
+            return Mode::computerSource;
+        case Traits::elementClassId:
+            return Mode::elementSource;
+        case Traits::associationClassId:
+            return Mode::associationList;
+        default:
+            return Mode::inert;
+    }
 }
 
 template <class Traits>
 void SettingAdapter<Traits>::position(const CMPIObjectPath* path) {
-    if (isFromElement()) {
-        computer.setObjectPath(locateComputer(path));
-    } else if (isAssociationList()) {
-        computer.setObjectPath(ProviderUtilities::createObjectPath(broker, computerClass, nameSpace));
-    } else if (isFromComputer()) {
-        element.setObjectPath(locateElement(path));
+    switch (mode()) {
+        case Mode::elementSource:
+            computer.setObjectPath(locateComputer(path));
+            break;
+        case Mode::associationList:
+            computer.setObjectPath(ProviderUtilities::createObjectPath(broker, computerClass, nameSpace));
+            break;
+        case Mode::computerSource:
+            element.setObjectPath(locateElement(path));
+            break;
+        case Mode::inert:
+            break;
     }
 }
 
 template <class Traits>
 SettingAdapter<Traits>::operator bool() {
     const Traced traced(at(Traits::traceSource));
-    if (isFromElement()) {
-        return computer;
+    switch (mode()) {
+        case Mode::elementSource:
+            return computer;
+        case Mode::associationList:
+            return computer || element;
+        case Mode::computerSource:
+            return element;
+        case Mode::inert:
+            break;
     }
-    if (isAssociationList()) {
-        return computer || element;
-    }
-    return isFromComputer() && element;
+    return false;
 }
 
 template <class Traits>
 void SettingAdapter<Traits>::operator++() {
     const Traced traced(at(Traits::traceSource));
-    if (isFromElement()) {
-        ++computer;
-    } else if (isFromComputer()) {
-        ++element;
-    } else if (isAssociationList()) {
-        ++element;
-        if (!element) {
+    switch (mode()) {
+        case Mode::elementSource:
             ++computer;
-        }
+            break;
+        case Mode::associationList:
+            ++element;
+            if (!element) {
+                ++computer;
+            }
+            break;
+        case Mode::computerSource:
+            ++element;
+            break;
+        case Mode::inert:
+            break;
     }
 }
 
@@ -108,15 +138,27 @@ CMPIInstance* SettingAdapter<Traits>::getCMPIInstance(const char** properties) {
 template <class Traits>
 CMPIObjectPath* SettingAdapter<Traits>::getAssociatorNames() {
     const Traced traced(at(Traits::traceSource));
-    return isFromComputer() ? element.getObjectPath() : isFromElement() ? computer.getObjectPath() : nullptr;
+    switch (mode()) {
+        case Mode::computerSource:
+            return element.getObjectPath();
+        case Mode::elementSource:
+            return computer.getObjectPath();
+        default:
+            return nullptr;
+    }
 }
 
 template <class Traits>
 CMPIInstance* SettingAdapter<Traits>::getAssociator(const char** properties) {
     const Traced traced(at(Traits::traceSource, Level::error), label::properties, properties);
-    return isFromComputer()  ? element.getCMPIInstance(properties)
-           : isFromElement() ? computer.getCMPIInstance(properties)
-                             : nullptr;
+    switch (mode()) {
+        case Mode::computerSource:
+            return element.getCMPIInstance(properties);
+        case Mode::elementSource:
+            return computer.getCMPIInstance(properties);
+        default:
+            return nullptr;
+    }
 }
 
 /** Returns a path of the class whose keys are the translated keys of the source path. */

@@ -212,8 +212,8 @@ bool AssetIDDetails::comparedValue(FilterType type, std::string& value) const {
 }
 
 template <class Member, class Value>
-bool AssetIDDetails::stored(const Member& member, Value& value, const char* function, unsigned int line) const {
-    const Traced traced(at(traceSource, Level::flow, function, line));
+bool AssetIDDetails::stored(const CallSite& site, const Member& member, Value& value) const {
+    const Traced traced(site);
     if (_Loaded) {
         if constexpr (std::is_same_v<Member, DateTime>) {
             value = Utils::convertCIMDateTime(member);
@@ -225,8 +225,8 @@ bool AssetIDDetails::stored(const Member& member, Value& value, const char* func
 }
 
 template <class Member, class Value>
-void AssetIDDetails::store(Member& member, const Value& value, const char* function, unsigned int line) {
-    const Traced traced(at(traceSource, Level::flow, function, line));
+void AssetIDDetails::store(const CallSite& site, Member& member, const Value& value) {
+    const Traced traced(site);
     if constexpr (std::is_same_v<Member, DateTime>) {
         member = Utils::convertStringToDateTime(value);
     } else {
@@ -234,14 +234,61 @@ void AssetIDDetails::store(Member& member, const Value& value, const char* funct
     }
 }
 
-template bool AssetIDDetails::stored(const std::string&, std::string&, const char*, unsigned int) const;
-template bool AssetIDDetails::stored(const DateTime&, std::string&, const char*, unsigned int) const;
-template bool AssetIDDetails::stored(const std::vector<PersonalizedPair>&, std::vector<PersonalizedPair>&, const char*,
-                                     unsigned int) const;
-template void AssetIDDetails::store(std::string&, const std::string&, const char*, unsigned int);
-template void AssetIDDetails::store(DateTime&, const std::string&, const char*, unsigned int);
-template void AssetIDDetails::store(std::vector<PersonalizedPair>&, const std::vector<PersonalizedPair>&, const char*,
-                                    unsigned int);
+bool AssetIDDetails::getAssetNumber(std::string& value) const {
+    return stored(at(traceSource), _AssetNumber, value);
+}
+
+bool AssetIDDetails::getAssetIdTag(std::string& value) const {
+    return stored(at(traceSource), _AssetIdTag, value);
+}
+
+bool AssetIDDetails::getPrimaryOwnerName(std::string& value) const {
+    return stored(at(traceSource), _OwnerName, value);
+}
+
+bool AssetIDDetails::getPrimaryOwnerPhone(std::string& value) const {
+    return stored(at(traceSource), _OwnerPhone, value);
+}
+
+bool AssetIDDetails::getPrimaryOwnerPosition(std::string& value) const {
+    return stored(at(traceSource), _OwnerPosition, value);
+}
+
+bool AssetIDDetails::getPrimaryOwnerDepartment(std::string& value) const {
+    return stored(at(traceSource), _OwnerDepartment, value);
+}
+
+bool AssetIDDetails::getSystemLocation(std::string& value) const {
+    return stored(at(traceSource), _SystemLocation, value);
+}
+
+bool AssetIDDetails::getZOPMProfile(std::string& value) const {
+    return stored(at(traceSource), _ZOPMProfile, value);
+}
+
+bool AssetIDDetails::getDeploymentProfile(std::string& value) const {
+    return stored(at(traceSource), _ZOPMProfile, value);
+}
+
+bool AssetIDDetails::getLastInventoried(std::string& value) const {
+    return stored(at(traceSource), _LastInventoried, value);
+}
+
+bool AssetIDDetails::getPurchaseDate(std::string& value) const {
+    return stored(at(traceSource), _PurchaseDate, value);
+}
+
+bool AssetIDDetails::getZOPMUpdateTime(std::string& value) const {
+    return stored(at(traceSource), _ZOPMUpdateTime, value);
+}
+
+bool AssetIDDetails::getDeploymentUpdateTime(std::string& value) const {
+    return stored(at(traceSource), _ZOPMUpdateTime, value);
+}
+
+bool AssetIDDetails::getPersonalizedData(std::vector<PersonalizedPair>& value) const {
+    return stored(at(traceSource), _PersonalizedData, value);
+}
 
 bool AssetIDDetails::getCSName(std::string& value) const {
     const Traced traced(at(traceSource));
@@ -300,6 +347,50 @@ unsigned int AssetIDDetails::getAssetIDStringArea() const {
 std::string AssetIDDetails::getLocalDateTime() const {
     const Traced traced(at(traceSource));
     return Utils::convertCIMDateTime(DateTime(std::time(nullptr), presentTime));
+}
+
+void AssetIDDetails::setAssetNumber(const std::string& value) {
+    store(at(traceSource), _AssetNumber, value);
+}
+
+void AssetIDDetails::setOwnerName(const std::string& value) {
+    store(at(traceSource), _OwnerName, value);
+}
+
+void AssetIDDetails::setOwnerPhone(const std::string& value) {
+    store(at(traceSource), _OwnerPhone, value);
+}
+
+void AssetIDDetails::setOwnerPosition(const std::string& value) {
+    store(at(traceSource), _OwnerPosition, value);
+}
+
+void AssetIDDetails::setOwnerDepartment(const std::string& value) {
+    store(at(traceSource), _OwnerDepartment, value);
+}
+
+void AssetIDDetails::setSystemLocation(const std::string& value) {
+    store(at(traceSource), _SystemLocation, value);
+}
+
+void AssetIDDetails::setZOPMProfile(const std::string& value) {
+    store(at(traceSource), _ZOPMProfile, value);
+}
+
+void AssetIDDetails::setLastInventoried(const std::string& value) {
+    store(at(traceSource), _LastInventoried, value);
+}
+
+void AssetIDDetails::setSystemPurchaseDate(const std::string& value) {
+    store(at(traceSource), _PurchaseDate, value);
+}
+
+void AssetIDDetails::setZOPMUpdateTime(const std::string& value) {
+    store(at(traceSource), _ZOPMUpdateTime, value);
+}
+
+void AssetIDDetails::setPersonalizedData(const std::vector<PersonalizedPair>& value) {
+    store(at(traceSource), _PersonalizedData, value);
 }
 
 }  // namespace KO::LeaseWarrantyProvider

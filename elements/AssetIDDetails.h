@@ -11,6 +11,7 @@
 namespace KO {
 
 class PropertyFile;
+struct CallSite;
 
 /** Locked while the asset data file is created, read or written. */
 extern Mutex _fileMutex;
@@ -82,24 +83,23 @@ public:
     std::wstring getFileName();
 
     /** @name Stored values
-     * Each returns whether the file was read. Dates are CIM datetime strings. The deployment values are the ZOPM
-     * values.
+     * Each returns whether the file was read. Dates are CIM datetime strings.
      */
     ///@{
-    bool getAssetNumber(std::string& value) const { return stored(_AssetNumber, value); }
-    bool getAssetIdTag(std::string& value) const { return stored(_AssetIdTag, value); }
-    bool getPrimaryOwnerName(std::string& value) const { return stored(_OwnerName, value); }
-    bool getPrimaryOwnerPhone(std::string& value) const { return stored(_OwnerPhone, value); }
-    bool getPrimaryOwnerPosition(std::string& value) const { return stored(_OwnerPosition, value); }
-    bool getPrimaryOwnerDepartment(std::string& value) const { return stored(_OwnerDepartment, value); }
-    bool getSystemLocation(std::string& value) const { return stored(_SystemLocation, value); }
-    bool getZOPMProfile(std::string& value) const { return stored(_ZOPMProfile, value); }
-    bool getDeploymentProfile(std::string& value) const { return stored(_ZOPMProfile, value); }
-    bool getLastInventoried(std::string& value) const { return stored(_LastInventoried, value); }
-    bool getPurchaseDate(std::string& value) const { return stored(_PurchaseDate, value); }
-    bool getZOPMUpdateTime(std::string& value) const { return stored(_ZOPMUpdateTime, value); }
-    bool getDeploymentUpdateTime(std::string& value) const { return stored(_ZOPMUpdateTime, value); }
-    bool getPersonalizedData(std::vector<PersonalizedPair>& value) const { return stored(_PersonalizedData, value); }
+    bool getAssetNumber(std::string& value) const;
+    bool getAssetIdTag(std::string& value) const;
+    bool getPrimaryOwnerName(std::string& value) const;
+    bool getPrimaryOwnerPhone(std::string& value) const;
+    bool getPrimaryOwnerPosition(std::string& value) const;
+    bool getPrimaryOwnerDepartment(std::string& value) const;
+    bool getSystemLocation(std::string& value) const;
+    bool getZOPMProfile(std::string& value) const;
+    bool getDeploymentProfile(std::string& value) const;  ///< same value as getZOPMProfile()
+    bool getLastInventoried(std::string& value) const;
+    bool getPurchaseDate(std::string& value) const;
+    bool getZOPMUpdateTime(std::string& value) const;
+    bool getDeploymentUpdateTime(std::string& value) const;  ///< same value as getZOPMUpdateTime()
+    bool getPersonalizedData(std::vector<PersonalizedPair>& value) const;
     ///@}
 
     /** @name Values of the computer
@@ -129,17 +129,17 @@ public:
      * Dates are CIM datetime strings. The asset tag has no setter.
      */
     ///@{
-    void setAssetNumber(const std::string& value) { store(_AssetNumber, value); }
-    void setOwnerName(const std::string& value) { store(_OwnerName, value); }
-    void setOwnerPhone(const std::string& value) { store(_OwnerPhone, value); }
-    void setOwnerPosition(const std::string& value) { store(_OwnerPosition, value); }
-    void setOwnerDepartment(const std::string& value) { store(_OwnerDepartment, value); }
-    void setSystemLocation(const std::string& value) { store(_SystemLocation, value); }
-    void setZOPMProfile(const std::string& value) { store(_ZOPMProfile, value); }
-    void setLastInventoried(const std::string& value) { store(_LastInventoried, value); }
-    void setSystemPurchaseDate(const std::string& value) { store(_PurchaseDate, value); }
-    void setZOPMUpdateTime(const std::string& value) { store(_ZOPMUpdateTime, value); }
-    void setPersonalizedData(const std::vector<PersonalizedPair>& value) { store(_PersonalizedData, value); }
+    void setAssetNumber(const std::string& value);
+    void setOwnerName(const std::string& value);
+    void setOwnerPhone(const std::string& value);
+    void setOwnerPosition(const std::string& value);
+    void setOwnerDepartment(const std::string& value);
+    void setSystemLocation(const std::string& value);
+    void setZOPMProfile(const std::string& value);
+    void setLastInventoried(const std::string& value);
+    void setSystemPurchaseDate(const std::string& value);
+    void setZOPMUpdateTime(const std::string& value);
+    void setPersonalizedData(const std::vector<PersonalizedPair>& value);
     ///@}
 
 private:
@@ -153,13 +153,11 @@ private:
 
     /** Reads a member if the file was read; a date as its CIM datetime string. Traced under the name of the caller. */
     template <class Member, class Value>
-    bool stored(const Member& member, Value& value, const char* function = __builtin_FUNCTION(),
-                unsigned int line = __builtin_LINE()) const;
+    bool stored(const CallSite& site, const Member& member, Value& value) const;
 
     /** Changes a member; a date from its CIM datetime string. Traced under the name of the caller. */
     template <class Member, class Value>
-    static void store(Member& member, const Value& value, const char* function = __builtin_FUNCTION(),
-                      unsigned int line = __builtin_LINE());
+    static void store(const CallSite& site, Member& member, const Value& value);
 
     bool _Loaded = false;
     std::wstring _FileName{};

@@ -9,6 +9,7 @@ namespace KO::LeaseWarrantyProvider {
 struct LeaseSettingElementTraits {
     using Element = Lease;
     static constexpr const char* constructor = "LeaseSetting";
+    static constexpr const char* destructor = "~LeaseSetting";
     static constexpr const char* toElement = "getLeaseMoniker";
     static constexpr bool toElementExits = false;  // the exit is not traced, unlike that of every other operation
     static constexpr const char* elementLabel = " monikerLease=";

@@ -10,13 +10,22 @@ namespace KO::LeaseWarrantyProvider {
 
 /** The names in the log and the messages of a record element, derived from its class name ("Lease"). */
 struct RecordElementNames {
-    const char* className;
-    FixedString destructorName{"~", className};
-    FixedString createName{"create", className};
-    FixedString removeName{"remove", className};
-    FixedString elementName{className, " Information"};                     ///< value of the ElementName property
-    FixedString removeUnfiltered{"Identify a ", className, " to remove."};  ///< thrown without a filter
-    FixedString identifierMissing{"Could not find Instance ID property on ", className, "."};  ///< thrown by evaluate()
+    explicit constexpr RecordElementNames(const char* className)
+        : name{className},
+          destructorName{"~", className},
+          createName{"create", className},
+          removeName{"remove", className},
+          elementName{className, " Information"},
+          removeUnfiltered{"Identify a ", className, " to remove."},
+          identifierMissing{"Could not find Instance ID property on ", className, "."} {}
+
+    FixedString name;
+    FixedString destructorName;
+    FixedString createName;
+    FixedString removeName;
+    FixedString elementName;        ///< value of the ElementName property
+    FixedString removeUnfiltered;   ///< thrown if a record is removed without a filter
+    FixedString identifierMissing;  ///< thrown if the current record has no identifier
 };
 
 /**
@@ -77,10 +86,10 @@ public:
      */
     ///@{
     bool getElementName(std::string& value) const;
-    bool getCaption(std::string&) const { return notAvailable(); }
-    bool getDescription(std::string&) const { return notAvailable(); }
-    bool getConfigurationName(std::string&) const { return notAvailable(); }
-    bool getChangeableType(unsigned short&) const { return notAvailable(); }
+    bool getCaption(std::string& value) const;
+    bool getDescription(std::string& value) const;
+    bool getConfigurationName(std::string& value) const;
+    bool getChangeableType(unsigned short& value) const;
     ///@}
 
     /** Reads the current record's identifier. Throws InstrumentationException if there is no current record. */
@@ -89,16 +98,11 @@ public:
 protected:
     using Property = typename Traits::Base::Property;
 
-    /** The getter of a property that no record has. Traced under the name of the calling operation. */
-    bool notAvailable(const char* function = __builtin_FUNCTION(), unsigned int line = __builtin_LINE()) const;
-
     /** Reads or writes a property of the current record. Traced under the name of the calling operation. */
     template <class Value>
-    bool get(Property property, Value& value, const char* function = __builtin_FUNCTION(),
-             unsigned int line = __builtin_LINE()) const;
+    bool get(const CallSite& site, Property property, Value& value) const;
     template <class Value>
-    void set(Property property, const Value& value, const char* function = __builtin_FUNCTION(),
-             unsigned int line = __builtin_LINE());
+    void set(const CallSite& site, Property property, const Value& value);
 
     /**
      * Moves to the first record that passes all filters, starting at the current one. Each record on the way is traced;

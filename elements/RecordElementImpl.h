@@ -12,7 +12,7 @@ namespace KO::LeaseWarrantyProvider {
 
 template <class Traits>
 RecordElement<Traits>::RecordElement() {
-    const Traced traced(at(Traits::traceSource, Level::flow, Traits::names.className));
+    const Traced traced(at(Traits::traceSource, Level::flow, Traits::names.name));
 }
 
 template <class Traits>
@@ -82,15 +82,39 @@ bool RecordElement<Traits>::getElementName(std::string& value) const {
     return true;
 }
 
-template <class Traits>
-bool RecordElement<Traits>::notAvailable(const char* function, unsigned int line) const {
-    const Traced traced(at(Traits::traceSource, Level::flow, function, line));
+namespace {
+
+/** Common implementation of the getters of properties that no record has. */
+bool notAvailable(const CallSite& site) {
+    const Traced traced(site);
     return false;
+}
+
+}  // namespace
+
+template <class Traits>
+bool RecordElement<Traits>::getCaption(std::string&) const {
+    return notAvailable(at(Traits::traceSource));
+}
+
+template <class Traits>
+bool RecordElement<Traits>::getDescription(std::string&) const {
+    return notAvailable(at(Traits::traceSource));
+}
+
+template <class Traits>
+bool RecordElement<Traits>::getConfigurationName(std::string&) const {
+    return notAvailable(at(Traits::traceSource));
+}
+
+template <class Traits>
+bool RecordElement<Traits>::getChangeableType(unsigned short&) const {
+    return notAvailable(at(Traits::traceSource));
 }
 
 template <class Traits>
 bool RecordElement<Traits>::getInstanceID(std::string& value) const {
-    return get(Property::InstanceID, value);
+    return get(at(Traits::traceSource), Property::InstanceID, value);
 }
 
 template <class Traits>
@@ -111,15 +135,15 @@ void RecordElement<Traits>::remove() {
 
 template <class Traits>
 template <class Value>
-bool RecordElement<Traits>::get(Property property, Value& value, const char* function, unsigned int line) const {
-    const Traced traced(at(Traits::traceSource, Level::flow, function, line));
+bool RecordElement<Traits>::get(const CallSite& site, Property property, Value& value) const {
+    const Traced traced(site);
     return base.getProperty(property, value);
 }
 
 template <class Traits>
 template <class Value>
-void RecordElement<Traits>::set(Property property, const Value& value, const char* function, unsigned int line) {
-    const Traced traced(at(Traits::traceSource, Level::flow, function, line));
+void RecordElement<Traits>::set(const CallSite& site, Property property, const Value& value) {
+    const Traced traced(site);
     base.setProperty(property, value);
 }
 

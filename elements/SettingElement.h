@@ -19,7 +19,7 @@ namespace KO::LeaseWarrantyProvider {
  * Traits defines:
  *   Element                          the element of the records
  *   traceSource                      trace source
- *   constructor                      its name in the log
+ *   constructor, destructor          their names in the log
  *   toElement, toElementExits        name of getElementMoniker() in the log, and whether its exit is traced
  *   elementLabel                     label of the record's moniker
  */

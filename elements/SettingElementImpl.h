@@ -7,7 +7,6 @@
 #include <new>
 #include <string>
 
-#include "FixedString.h"
 #include "KO/Exceptions.h"
 #include "SettingElement.h"
 
@@ -80,7 +79,7 @@ SettingElement<Traits>::SettingElement() {
 
 template <class Traits>
 SettingElement<Traits>::~SettingElement() noexcept(false) {
-    traceMethod(at(Traits::traceSource, Level::flow, destructorName<Traits>));
+    traceMethod(at(Traits::traceSource, Level::flow, Traits::destructor));
 }
 
 template <class Traits>

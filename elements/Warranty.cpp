@@ -13,9 +13,29 @@ const TraceSource WarrantyElementTraits::traceSource{loggerWarranty, "Warranty.c
 const RecordElementNames WarrantyElementTraits::names{"Warranty"};
 
 template class RecordElement<WarrantyElementTraits>;
-template bool RecordElement<WarrantyElementTraits>::get(Property, std::string&, const char*, unsigned int) const;
-template bool RecordElement<WarrantyElementTraits>::get(Property, unsigned int&, const char*, unsigned int) const;
-template void RecordElement<WarrantyElementTraits>::set(Property, const std::string&, const char*, unsigned int);
-template void RecordElement<WarrantyElementTraits>::set(Property, const unsigned int&, const char*, unsigned int);
+
+bool Warranty::getWarrantor(std::string& value) const {
+    return get(at(WarrantyElementTraits::traceSource), Property::Warrantor, value);
+}
+
+bool Warranty::getCommencementDate(std::string& value) const {
+    return get(at(WarrantyElementTraits::traceSource), Property::CommencementDate, value);
+}
+
+bool Warranty::getDuration(unsigned int& value) const {
+    return get(at(WarrantyElementTraits::traceSource), Property::Duration, value);
+}
+
+void Warranty::setWarrantor(std::string value) {
+    set(at(WarrantyElementTraits::traceSource), Property::Warrantor, value);
+}
+
+void Warranty::setCommencementDate(std::string value) {
+    set(at(WarrantyElementTraits::traceSource), Property::CommencementDate, value);
+}
+
+void Warranty::setDuration(unsigned int value) {
+    set(at(WarrantyElementTraits::traceSource), Property::Duration, value);
+}
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -19,20 +19,20 @@ struct WarrantyElementTraits {
  * The managed element of VELKO_Warranty: a cursor over the warranties of this computer.
  *
  * The getters of the current warranty return true. Getters and setters throw InstrumentationException if there is no
- * current warranty. The date is a CIM datetime string.
+ * current warranty.
  */
 class Warranty : public RecordElement<WarrantyElementTraits> {
 public:
     bool createWarranty(std::string instanceId) { return create(instanceId); }
     void removeWarranty() { remove(); }
 
-    bool getWarrantor(std::string& value) const { return get(Property::Warrantor, value); }
-    bool getCommencementDate(std::string& value) const { return get(Property::CommencementDate, value); }
-    bool getDuration(unsigned int& value) const { return get(Property::Duration, value); }
+    bool getWarrantor(std::string& value) const;
+    bool getCommencementDate(std::string& value) const;  ///< CIM datetime string
+    bool getDuration(unsigned int& value) const;
 
-    void setWarrantor(std::string value) { set(Property::Warrantor, value); }
-    void setCommencementDate(std::string value) { set(Property::CommencementDate, value); }
-    void setDuration(unsigned int value) { set(Property::Duration, value); }
+    void setWarrantor(std::string value);
+    void setCommencementDate(std::string value);
+    void setDuration(unsigned int value);
 };
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -9,6 +9,7 @@ namespace KO::LeaseWarrantyProvider {
 struct WarrantySettingElementTraits {
     using Element = Warranty;
     static constexpr const char* constructor = "WarrantySetting";
+    static constexpr const char* destructor = "~WarrantySetting";
     static constexpr const char* toElement = "getWarrantyMoniker";
     static constexpr bool toElementExits = true;
     static constexpr const char* elementLabel = " monikerWarranty=";

@@ -34,7 +34,7 @@ HeaderRow hostRow() {
             {one("localhost"), one("LocalHost:5988"), one("127.0.0.1"), one("127.1.2.3:80"), one("[::1]"), one("[::1]:5988"),
              absent(forbidden), one("", forbidden), one("example.com", forbidden), one("localhost.example.com", forbidden),
              one("127.0.0.1.example.com", forbidden), one("example.com:127", forbidden), one("10.0.0.1", forbidden),
-             one("[::2]", forbidden), one("localhost@example.com", forbidden), twice("localhost", "localhost", forbidden)}};
+             one("[::2]", forbidden), one("localhost@example.com", forbidden), twice("localhost", "localhost", ambiguous)}};
 }
 
 HeaderRow contentTypeRow() {
@@ -63,7 +63,9 @@ std::vector<HeaderRow> bodyRows() {
              {one("1000"), absent(right), one("0"), one("0001000"),
               one("1001", tooLarge), one("99999999999999999999999", tooLarge), one("-1", ambiguous), one("+1", ambiguous),
               one("1 000", ambiguous), one("0x10", ambiguous), one("", ambiguous), twice("10", "10", ambiguous)}},
-            {"Transfer-Encoding", false, {absent(right), one("chunked")}},
+            {"Transfer-Encoding", false,
+             {absent(right), one("chunked"), one("gzip", ambiguous), one("", ambiguous), one("chunked, gzip", ambiguous),
+              twice("chunked", "chunked", ambiguous)}},
             {"Content-Encoding", false,
              {absent(right), one("Identity"), one("gzip", otherContent), one("", otherContent),
               twice("identity", "gzip", otherContent)}}};
@@ -132,7 +134,17 @@ const HeaderValue& ModelRequest::valueOf(const std::string& name) const {
                          [](const HeaderValue& each) { return each.sent.empty(); });
 }
 
+bool ModelRequest::isAmbiguous() const {
+    const bool hasTwoLengths = !valueOf("Content-Length").sent.empty() && !valueOf("Transfer-Encoding").sent.empty();
+    return hasTwoLengths || valueOf("Host").refusal.status == ambiguous.status ||
+           valueOf("Content-Length").refusal.status == ambiguous.status ||
+           valueOf("Transfer-Encoding").refusal.status != 0;
+}
+
 std::set<Refusal> ModelRequest::refusals() const {
+    if (isAmbiguous()) {
+        return {ambiguous};
+    }
     const bool isLocal = !requiresLocalHost || valueOf("Host").refusal.status == 0;
     if (!isLocal || valueOf("Origin").refusal.status != 0) {
         return {forbidden};
@@ -150,9 +162,6 @@ std::set<Refusal> ModelRequest::refusals() const {
         if (!isOfListener && refusal.status != 0) {
             reasons.insert(refusal);
         }
-    }
-    if (!valueOf("Content-Length").sent.empty() && !valueOf("Transfer-Encoding").sent.empty()) {
-        reasons.insert(ambiguous);
     }
     return reasons;
 }

@@ -54,6 +54,9 @@ struct ModelRequest {
 
     bool isExtended() const { return method == "M-POST"; }
 
+    /** Whether other software could see another end of the request, which is refused before all else. */
+    bool isAmbiguous() const;
+
     /** The reasons to refuse the request, of which the response has one; none: it is accepted. */
     std::set<Refusal> refusals() const;
 };

@@ -23,8 +23,4 @@ private:
     char characters[64]{};
 };
 
-/** The name of a destructor in the log. @tparam Traits has the name of the constructor */
-template <class Traits>
-constexpr FixedString destructorName{"~", Traits::constructor};
-
 }  // namespace KO::LeaseWarrantyProvider

@@ -13,12 +13,6 @@ const RecordStoreNames LeaseStoreTraits::names{"Lease"};
 template class RecordTrace<LeaseStoreTraits>;
 template class RecordCache<LeaseStoreTraits>;
 template class RecordBase<LeaseStoreTraits>;
-template bool RecordBase<LeaseStoreTraits>::get(Properties::Lease, std::string&, const char*, unsigned int) const;
-template bool RecordBase<LeaseStoreTraits>::get(Properties::Lease, unsigned int&, const char*, unsigned int) const;
-template bool RecordBase<LeaseStoreTraits>::get(Properties::Lease, bool&, const char*, unsigned int) const;
-template void RecordBase<LeaseStoreTraits>::set(Properties::Lease, const std::string&, const char*, unsigned int);
-template void RecordBase<LeaseStoreTraits>::set(Properties::Lease, const unsigned int&, const char*, unsigned int);
-template void RecordBase<LeaseStoreTraits>::set(Properties::Lease, const bool&, const char*, unsigned int);
 
 /** Defined after the logger's name and the tables, which its constructor uses. */
 template <>
@@ -34,6 +28,14 @@ std::ofstream& operator<<(std::ofstream& target, const LeaseUnit& lease) {
     const Traced traced(at(LeaseStoreTraits::traceSource), label::target, &target, label::lease, &lease);
     writeRecord(target, lease, LeaseStoreTraits::fields);
     return target;
+}
+
+bool LeaseBase::getProperty(Properties::Lease property, bool& value) const {
+    return get(at(LeaseStoreTraits::traceSource), property, value);
+}
+
+void LeaseBase::setProperty(Properties::Lease property, bool value) {
+    set(at(LeaseStoreTraits::traceSource), property, value, wrongTypeOrProperty);
 }
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -103,8 +103,8 @@ public:
 
     using RecordBase::getProperty;
     using RecordBase::setProperty;
-    bool getProperty(Properties::Lease property, bool& value) const { return get(property, value); }
-    void setProperty(Properties::Lease property, bool value) { set(property, value); }
+    bool getProperty(Properties::Lease property, bool& value) const;
+    void setProperty(Properties::Lease property, bool value);
 };
 
 template <>

@@ -8,28 +8,43 @@
 
 #include "FixedString.h"
 #include "IdentifierIndex.h"
-#include "RecordStream.h"
+#include "RecordFields.h"
 #include "Trace.h"
 
 namespace KO::LeaseWarrantyProvider {
 
 /** The names in the log and the messages of a record store, derived from the kind of its records ("Lease"). */
 struct RecordStoreNames {
-    const char* kind;
-    FixedString unitName{kind, "Unit"};  ///< the record type
-    FixedString cacheName{kind, "Cache"};
-    FixedString cacheDestructorName{"~", kind, "Cache"};
-    FixedString baseName{kind, "Base"};
-    FixedString baseDestructorName{"~", kind, "Base"};
-    FixedString selectName{"select", kind};
-    FixedString createName{"create", kind};
-    FixedString removeName{"delete", kind};
-    FixedString fileName{kind, ".dat"};          ///< name of the record file in the agent's data directory
-    FixedString countName{"recordCount", kind};  ///< name of the record count in the trace
-    FixedString noRecords{"Zero ", kind, " Records Available"};  ///< thrown if none is in use and the count is not 0
-    FixedString notAvailable{kind, " record not available"};     ///< thrown if no record is current
-    FixedString identifierExists{kind, " with the supplied instance Id exists."};  ///< thrown if a record in use has it
-    FixedString fileCannotBeOpened{"Could not open ", kind, " record."};  ///< thrown if the file cannot be rewritten
+    explicit constexpr RecordStoreNames(const char* kind)
+        : unitName{kind, "Unit"},
+          cacheName{kind, "Cache"},
+          cacheDestructorName{"~", kind, "Cache"},
+          baseName{kind, "Base"},
+          baseDestructorName{"~", kind, "Base"},
+          selectName{"select", kind},
+          createName{"create", kind},
+          removeName{"delete", kind},
+          fileName{kind, ".dat"},
+          countName{"recordCount", kind},
+          noRecords{"Zero ", kind, " Records Available"},
+          notAvailable{kind, " record not available"},
+          identifierExists{kind, " with the supplied instance Id exists."},
+          fileCannotBeOpened{"Could not open ", kind, " record."} {}
+
+    FixedString unitName;  ///< the record type
+    FixedString cacheName;
+    FixedString cacheDestructorName;
+    FixedString baseName;
+    FixedString baseDestructorName;
+    FixedString selectName;
+    FixedString createName;
+    FixedString removeName;
+    FixedString fileName;            ///< name of the record file in the agent's data directory
+    FixedString countName;           ///< name of the record count in the trace
+    FixedString noRecords;           ///< thrown if the count is not 0 and no record is in use
+    FixedString notAvailable;        ///< thrown if no record is current
+    FixedString identifierExists;    ///< thrown if a record in use has the identifier
+    FixedString fileCannotBeOpened;  ///< thrown if the record file cannot be rewritten
 };
 
 /**
@@ -147,20 +162,18 @@ public:
      * type, or if the identifier is set.
      */
     ///@{
-    bool getProperty(Property property, std::string& value) const { return get(property, value); }
-    bool getProperty(Property property, unsigned int& value) const { return get(property, value); }
-    void setProperty(Property property, std::string value) { set(property, value); }
-    void setProperty(Property property, unsigned int value) { set(property, value); }
+    bool getProperty(Property property, std::string& value) const;
+    bool getProperty(Property property, unsigned int& value) const;
+    void setProperty(Property property, std::string value);
+    void setProperty(Property property, unsigned int value);
     ///@}
 
 protected:
     /** Typed access, traced under the name of the calling operation. */
     template <class Value>
-    bool get(Property property, Value& value, const char* function = __builtin_FUNCTION(),
-             unsigned int line = __builtin_LINE()) const;
+    bool get(const CallSite& site, Property property, Value& value) const;
     template <class Value>
-    void set(Property property, const Value& value, const char* function = __builtin_FUNCTION(),
-             unsigned int line = __builtin_LINE());
+    void set(const CallSite& site, Property property, const Value& value, const char* wrongType);
 
 private:
     using Unit = typename Traits::Unit;

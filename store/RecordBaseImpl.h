@@ -15,12 +15,8 @@ namespace KO::LeaseWarrantyProvider {
 
 namespace {
 constexpr const char* wrongTypeOrProperty = "Incorrect Type or Property";
-template <class Value>
-constexpr const char* wrongTypeForSetting = wrongTypeOrProperty;
-template <>
-constexpr const char* wrongTypeForSetting<unsigned int> = "Incorrect Type or Property.";
-template <>
-constexpr const char* wrongTypeForSetting<std::string> = "Incorrect Type or Property or Property is read-Only.";
+constexpr const char* wrongTypeOrPropertyOfNumber = "Incorrect Type or Property.";
+constexpr const char* wrongTypeOrReadOnly = "Incorrect Type or Property or Property is read-Only.";
 constexpr const char* recordsExceedMemory = "The records of the file do not fit into memory.";
 }  // namespace
 
@@ -213,8 +209,7 @@ Value RecordBase<Traits>::Unit::*RecordBase<Traits>::memberOf(Property property,
 
 template <class Traits>
 template <class Value>
-bool RecordBase<Traits>::get(Property property, Value& value, const char* function, unsigned int line) const {
-    const CallSite site = at(Traits::traceSource, Level::flow, function, line);
+bool RecordBase<Traits>::get(const CallSite& site, Property property, Value& value) const {
     const Traced traced(site, label::property, property, label::value, value);
     requireCurrent(site);
     const auto member = memberOf<Value>(property, false);
@@ -227,16 +222,35 @@ bool RecordBase<Traits>::get(Property property, Value& value, const char* functi
 
 template <class Traits>
 template <class Value>
-void RecordBase<Traits>::set(Property property, const Value& value, const char* function, unsigned int line) {
-    const CallSite site = at(Traits::traceSource, Level::flow, function, line);
+void RecordBase<Traits>::set(const CallSite& site, Property property, const Value& value, const char* wrongType) {
     const Traced traced(site, label::property, property, label::value, value);
     requireCurrent(site);
     const auto member = memberOf<Value>(property, true);
     if (member == nullptr) {
-        fail<InstrumentationException>(site, wrongTypeForSetting<Value>);
+        fail<InstrumentationException>(site, wrongType);
     }
     cache.table[cursor].*member = value;
     cacheModified = true;
+}
+
+template <class Traits>
+bool RecordBase<Traits>::getProperty(Property property, std::string& value) const {
+    return get(at(Traits::traceSource), property, value);
+}
+
+template <class Traits>
+bool RecordBase<Traits>::getProperty(Property property, unsigned int& value) const {
+    return get(at(Traits::traceSource), property, value);
+}
+
+template <class Traits>
+void RecordBase<Traits>::setProperty(Property property, std::string value) {
+    set(at(Traits::traceSource), property, value, wrongTypeOrReadOnly);
+}
+
+template <class Traits>
+void RecordBase<Traits>::setProperty(Property property, unsigned int value) {
+    set(at(Traits::traceSource), property, value, wrongTypeOrPropertyOfNumber);
 }
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -13,12 +13,6 @@ const RecordStoreNames WarrantyStoreTraits::names{"Warranty"};
 template class RecordTrace<WarrantyStoreTraits>;
 template class RecordCache<WarrantyStoreTraits>;
 template class RecordBase<WarrantyStoreTraits>;
-template bool RecordBase<WarrantyStoreTraits>::get(Properties::Warranty, std::string&, const char*, unsigned int) const;
-template bool RecordBase<WarrantyStoreTraits>::get(Properties::Warranty, unsigned int&, const char*,
-                                                   unsigned int) const;
-template void RecordBase<WarrantyStoreTraits>::set(Properties::Warranty, const std::string&, const char*, unsigned int);
-template void RecordBase<WarrantyStoreTraits>::set(Properties::Warranty, const unsigned int&, const char*,
-                                                   unsigned int);
 
 /** Defined after the logger's name and the tables, which its constructor uses. */
 template <>

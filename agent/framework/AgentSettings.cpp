@@ -48,7 +48,11 @@ void readProduct(Agent::TableReader table, AgentSettings& settings) {
     product.name = table.nonEmptyString("name").value_or("Ostrel");
     product.version = table.nonEmptyString("version").value_or(AGENT_VERSION);
     product.buildNumber = table.nonEmptyString("build_number").value_or("1");
-    product.identifyingNumber = table.nonEmptyString("identifying_number").value_or(defaultIdentifyingNumber());
+    if (std::optional<std::string> number = table.nonEmptyString("identifying_number")) {
+        product.identifyingNumber = std::move(*number);
+    } else {  // reads a file
+        product.identifyingNumber = defaultIdentifyingNumber();
+    }
     product.vendor = table.nonEmptyString("vendor").value_or("VEL");
     table.rejectUnknownKeys();
 }

@@ -45,21 +45,10 @@ void recordIfNull(WrappedBroker& wrapper, Object made, Arguments... arguments) {
     }
 }
 
-/** The member that replaces the one of a slot: data are copied, and other functions cannot be forwarded. */
+/** The function that replaces the one of a slot. */
 template <auto slot>
-struct Forward {
-    template <class Table>
-    static auto in(const Table& original) {
-        using Member = std::decay_t<decltype(original.*slot)>;
-        if constexpr (std::is_function_v<std::remove_pointer_t<Member>>) {
-            return nullptr;
-        } else {
-            return original.*slot;
-        }
-    }
-};
+struct Forward;
 
-/** The same for a function of a broker. */
 template <class Table, class Result, class... Arguments, Result (*Table::*slot)(const CMPIBroker*, Arguments...)>
 struct Forward<slot> {
     static Result call(const CMPIBroker* broker, Arguments... arguments) {
@@ -81,34 +70,55 @@ struct Forward<slot> {
     static auto in(const Table& original) { return original.*slot != nullptr ? &call : nullptr; }
 };
 
-/** The table that replaces another one. @tparam slots all members of the table, in order */
+/** Fills these slots of an empty table. */
 template <auto... slots, class Table>
-Table forwarded(const Table* original) {
-    return original == nullptr ? Table{} : Table{Forward<slots>::in(*original)...};
+void forward(const Table& original, Table& wrapped) {
+    ((wrapped.*slots = Forward<slots>::in(original)), ...);
 }
 
 CMPIBrokerFT wrapped(const CMPIBrokerFT* original) {
+    CMPIBrokerFT services{};
+    if (original == nullptr) {
+        return services;
+    }
+    services.brokerCapabilities = original->brokerCapabilities;
+    services.brokerVersion = original->brokerVersion;
+    services.brokerName = original->brokerName;
     using T = CMPIBrokerFT;
-    return forwarded<&T::brokerCapabilities, &T::brokerVersion, &T::brokerName, &T::prepareAttachThread,
-                     &T::attachThread, &T::detachThread, &T::deliverIndication, &T::enumerateInstanceNames,
-                     &T::getInstance, &T::createInstance, &T::modifyInstance, &T::deleteInstance, &T::execQuery,
-                     &T::enumerateInstances, &T::associators, &T::associatorNames, &T::references, &T::referenceNames,
-                     &T::invokeMethod, &T::setProperty, &T::getProperty>(original);
+    forward<&T::prepareAttachThread, &T::attachThread, &T::detachThread, &T::deliverIndication,
+            &T::enumerateInstanceNames, &T::getInstance, &T::createInstance, &T::modifyInstance, &T::deleteInstance,
+            &T::execQuery, &T::enumerateInstances, &T::associators, &T::associatorNames, &T::references,
+            &T::referenceNames, &T::invokeMethod, &T::setProperty, &T::getProperty>(*original, services);
+    return services;
 }
 
 CMPIBrokerEncFT wrapped(const CMPIBrokerEncFT* original) {
+    CMPIBrokerEncFT encapsulation{};
+    if (original == nullptr) {
+        return encapsulation;
+    }
+    encapsulation.ftVersion = original->ftVersion;
     using T = CMPIBrokerEncFT;
-    return forwarded<&T::ftVersion, &T::newInstance, &T::newObjectPath, &T::newArgs, &T::newString, &T::newArray,
-                     &T::newDateTime, &T::newDateTimeFromBinary, &T::newDateTimeFromChars, &T::newSelectExp,
-                     &T::classPathIsA, &T::toString, &T::isOfType, &T::getType, &T::getMessage, &T::logMessage,
-                     &T::trace, &T::newCMPIError, &T::openMessageFile, &T::closeMessageFile, &T::getMessage2>(original);
+    forward<&T::newInstance, &T::newObjectPath, &T::newArgs, &T::newString, &T::newArray, &T::newDateTime,
+            &T::newDateTimeFromBinary, &T::newDateTimeFromChars, &T::newSelectExp, &T::classPathIsA, &T::toString,
+            &T::isOfType, &T::getType, &T::logMessage, &T::trace, &T::newCMPIError, &T::openMessageFile,
+            &T::closeMessageFile>(*original, encapsulation);
+    return encapsulation;
+}
+
+/** Fills this table at once, in its own order, since its version is a constant. */
+template <auto... slots>
+CMPIBrokerMemFT inOrder(const CMPIBrokerMemFT& original) {
+    return {original.ftVersion, Forward<slots>::in(original)...};
 }
 
 CMPIBrokerMemFT wrapped(const CMPIBrokerMemFT* original) {
     using T = CMPIBrokerMemFT;
-    return forwarded<&T::ftVersion, &T::mark, &T::release, &T::cmpiMalloc, &T::cmpiCalloc, &T::cmpiRealloc,
-                     &T::cmpiStrDup, &T::cmpiFree, &T::freeInstance, &T::freeObjectPath, &T::freeArgs, &T::freeString,
-                     &T::freeArray, &T::freeDateTime, &T::freeSelectExp>(original);
+    return original == nullptr
+               ? CMPIBrokerMemFT{}
+               : inOrder<&T::mark, &T::release, &T::cmpiMalloc, &T::cmpiCalloc, &T::cmpiRealloc, &T::cmpiStrDup,
+                         &T::cmpiFree, &T::freeInstance, &T::freeObjectPath, &T::freeArgs, &T::freeString,
+                         &T::freeArray, &T::freeDateTime, &T::freeSelectExp>(*original);
 }
 
 }  // namespace
