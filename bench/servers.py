@@ -1,8 +1,9 @@
 #!/usr/bin/env python3
 """Measures CIM servers with wrk, side by side, and prints a Markdown table.
 
-Each cell has the median time of a request in milliseconds and the requests per second. The servers must serve the same
-leases in root/cimv2, without authentication. The leases that CreateInstance makes are deleted.
+Each cell has the median time of a request in milliseconds and the requests per second, of the best of several rounds:
+in each round, all servers are measured one after the other, so that other load of the machine affects all. The servers
+must serve the same leases in root/cimv2, without authentication. The leases that CreateInstance makes are deleted.
 
 With --baseline, the program http_baseline sends the responses of the first server from memory.
 """
@@ -108,6 +109,11 @@ def measure_creation(server, connections, seconds):
     return measured
 
 
+def best_cells(servers, options, measure):
+    rounds = [[measure(each) for each in servers] for _ in range(options.rounds)]
+    return [cell(max(of_server, key=lambda each: each["requests"] / each["seconds"])) for of_server in zip(*rounds)]
+
+
 def rows(servers, options):
     for server in servers:
         server.delete_created()
@@ -118,14 +124,14 @@ def rows(servers, options):
     for operation, parameters in requests.items():
         baseline = Baseline(options.baseline, servers[0].ask(operation, parameters)) if options.baseline else None
         for connections in options.connections:
-            measured = [each.measure(operation, parameters, connections, options.seconds)
-                        for each in [*servers, *filter(None, [baseline])]]
-            yield operation, len(leases), connections, *map(cell, measured)
+            cells = best_cells([*servers, *filter(None, [baseline])], options,
+                               lambda each: each.measure(operation, parameters, connections, options.seconds))
+            yield operation, len(leases), connections, *cells
         if baseline:
             baseline.stop()
     for connections in options.connections:
-        measured = [cell(measure_creation(each, connections, options.seconds)) for each in servers]
-        yield "CreateInstance", len(leases), connections, *measured, *(["-"] if options.baseline else [])
+        cells = best_cells(servers, options, lambda each: measure_creation(each, connections, options.seconds))
+        yield "CreateInstance", len(leases), connections, *cells, *(["-"] if options.baseline else [])
 
 
 def main():
@@ -134,6 +140,7 @@ def main():
     parser.add_argument("--baseline", metavar="PROGRAM", type=pathlib.Path, help="the program http_baseline")
     parser.add_argument("--connections", metavar="N", type=int, nargs="+", default=[1, 8, 64])
     parser.add_argument("--seconds", type=int, default=5, help="of each measurement; default: %(default)s")
+    parser.add_argument("--rounds", type=int, default=3, help="default: %(default)s")
     options = parser.parse_args()
     servers = [Server(*each.split("=", 1)) for each in options.servers]
     names = [*(each.name for each in servers), *(["from memory"] if options.baseline else [])]
