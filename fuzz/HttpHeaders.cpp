@@ -1,4 +1,5 @@
 #include <array>
+#include <optional>
 #include <sstream>
 #include <string>
 
@@ -10,9 +11,9 @@
 #include "server/HeaderCheck.h"
 
 // The head of an HTTP request. An input that begins with a byte outside of ASCII chooses values of the model's table,
-// and the response must be the model's; an input of one low byte, the number of a header, represents all pairs of its
-// values with those of other headers. Any other input is a head, with a line for the method and one per header: a
-// refusal has a status, and an accepted request has all necessary headers.
+// and the response must be the model's; "pairs of Host" represents all pairs of a value of Host with one of another
+// header. Any other input is a head, with a line for the method and one per header: a refusal has a status, and an
+// accepted request has all necessary headers.
 
 namespace {
 
@@ -138,6 +139,16 @@ void requirePairs(ModelRequest model, std::size_t one) {
     }
 }
 
+/** The header that an input names after "pairs of "; none for other inputs. */
+std::optional<std::size_t> headerWhosePairs(std::string_view input) {
+    for (std::size_t row = 0; row < headerRows().size(); ++row) {
+        if (input == "pairs of " + headerRows()[row].name) {
+            return row;
+        }
+    }
+    return std::nullopt;
+}
+
 void requireRight(const HttpRequest& request, bool requiresLocalHost) {
     const auto checked = checkHeaders(request, {requiresLocalHost, fuzz::largestBody});
     if (const auto* accepted = std::get_if<CimHeaders>(&checked)) {
@@ -154,9 +165,9 @@ void requireRight(const HttpRequest& request, bool requiresLocalHost) {
 }  // namespace
 
 int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-    if (size == 1 && data[0] < headerRows().size()) {
-        requirePairs({"POST", ""}, data[0]);
-        requirePairs({"M-POST", "73-"}, data[0]);
+    if (const auto header = headerWhosePairs(fuzz::inputOf(data, size))) {
+        requirePairs({"POST", ""}, *header);
+        requirePairs({"M-POST", "73-"}, *header);
     } else if (size > 0 && data[0] >= 0x80) {
         requireModelsResponse(modelFrom({data, size}));
     } else {
