@@ -98,7 +98,7 @@ class Baseline(Server):
 
 def cell(measured):
     errors = f", {measured['errors']} errors" if measured["errors"] else ""
-    return f"{measured['milliseconds']:.2f} ms, {measured['requests'] / measured['seconds']:.0f}/s{errors}"
+    return f"{measured['milliseconds']:.2f}, {measured['requests'] / measured['seconds']:.0f}{errors}"
 
 
 def measure_creation(server, connections, seconds):
