@@ -141,6 +141,11 @@ OperationResult Operations::performMethod(const Message& message, const Schema& 
     throw CimError(CMPI_RC_ERR_METHOD_NOT_AVAILABLE, "Methods are not supported.");
 }
 
+bool Operations::returnsList(std::string_view method) {
+    const auto isFirst = [&](std::string_view word) { return cim::sameName(method.substr(0, word.size()), word); };
+    return isFirst("Enumerate") || isFirst("Associator") || isFirst("Reference") || isFirst("Open") || isFirst("Pull");
+}
+
 std::string Operations::subjectOf(const Message& message) {
     if (!message.isIntrinsic) {
         return message.object.substr(message.object.find(':') + 1);

@@ -56,6 +56,9 @@ public:
     /** Frees the results of open enumerations whose timeout has passed. To be called from time to time. */
     void removeExpired() { enumerations.removeExpired(OpenEnumerations::Clock::now()); }
 
+    /** Whether an operation returns as many results as there are, or as the client asks for. */
+    static bool returnsList(std::string_view method);
+
     /** The class that a message is about, for the access log; empty if there is none. */
     static std::string subjectOf(const Message& message);
 

@@ -12,27 +12,38 @@ class Quota {
 public:
     explicit Quota(std::size_t itsLimit) : limit(itsLimit) {}
 
-    /** A part of the amount, held until it is destroyed. */
+    using Time = std::chrono::steady_clock::time_point;
+
+    /** A part of the amount, held until it is destroyed. Initially nothing. */
     class Share {
     public:
-        /** Waits until the amount is available, or no other share is held: one may be larger than the limit. */
-        Share(Quota& itsQuota, std::size_t itsAmount, std::chrono::milliseconds patience)
-            : quota(itsQuota), amount(itsAmount), acquired(quota.acquire(amount, patience)) {}
+        Share() = default;
         ~Share() {
-            if (acquired) {
-                quota.release(amount);
+            if (quota != nullptr) {
+                quota->change(amount, 0);
             }
         }
         Share(const Share&) = delete;
         Share& operator=(const Share&) = delete;
 
-        /** Whether the amount became available in time. */
-        explicit operator bool() const { return acquired; }
+        /** Waits until one is available, and takes it. @return false if it is not available in time */
+        bool take(Quota& from, Time latest) {
+            if (from.acquire(latest)) {
+                quota = &from;
+                amount = 1;
+            }
+            return quota != nullptr;
+        }
+
+        /** Changes the amount of a share that was taken, without waiting: it may exceed the limit. */
+        void resize(std::size_t size) {
+            quota->change(amount, size);
+            amount = size;
+        }
 
     private:
-        Quota& quota;
-        std::size_t amount;
-        bool acquired;
+        Quota* quota = nullptr;
+        std::size_t amount = 0;
     };
 
     /** Whether a request waits for its share. */
@@ -42,22 +53,22 @@ public:
     }
 
 private:
-    bool acquire(std::size_t amount, std::chrono::milliseconds patience) {
+    bool acquire(Time latest) {
         std::unique_lock<std::mutex> lock(mutex);
         ++waiting;
-        const bool isAvailable = released.wait_for(lock, patience, [&] { return held == 0 || held + amount <= limit; });
+        const bool isAvailable = released.wait_until(lock, latest, [&] { return held < limit; });
         --waiting;
-        held += isAvailable ? amount : 0;
+        held += isAvailable ? 1 : 0;
         if (isAvailable && waiting != 0 && held < limit) {
             released.notify_one();  // a release notifies one, but may be enough for several
         }
         return isAvailable;
     }
 
-    void release(std::size_t amount) {
+    void change(std::size_t amount, std::size_t size) {
         {
             const std::lock_guard<std::mutex> lock(mutex);
-            held -= amount;
+            held = held - amount + size;
         }
         released.notify_one();
     }

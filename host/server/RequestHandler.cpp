@@ -9,6 +9,7 @@ constexpr std::chrono::seconds authorizationLifetime{60};
 constexpr unsigned badRequest = 400;
 constexpr unsigned timeout = 408;
 constexpr std::size_t patience = 4;  ///< multiple of the largest request that is received although it is refused
+constexpr char tooManyRequests[] = "The server has too many requests.";
 
 HttpResponse unauthorized() {
     HttpResponse response = refusal(401, "Send the name and password of a user who may use this server.");
@@ -31,6 +32,7 @@ RequestHandler::RequestHandler(const Settings& itsSettings, cimxml::Operations& 
       authenticator(itsAuthenticator),
       accessLog(itsLog),
       requests(itsSettings.limits.requestsAtWork),
+      lists(itsSettings.limits.requestsAtWork),
       results(itsSettings.limits.responseResults) {}
 
 std::optional<HttpResponse> RequestHandler::begin(Exchange& exchange, const HttpRequest& request) {
@@ -133,15 +135,29 @@ Reply RequestHandler::answer(Exchange& exchange) {
         return refusal(400, "The body does not have the length that Content-Length says.");
     }
     exchange.connection->trust();
-    const Quota::Share share(requests, 1, settings.limits.queueTime);
-    if (!share) {
-        return unavailable("The server has too many requests.");
-    }
     try {
-        return perform(exchange);
+        return performInTurn(exchange);
     } catch (const cimxml::RequestRefused& refused) {
         return refusal(refused.httpStatus, refused.what(), refused.cimError);
     }
+}
+
+/** A list waits for the results of others before it takes a place among all requests, so that short ones need not. */
+Reply RequestHandler::performInTurn(Exchange& exchange) {
+    const auto latest = std::chrono::steady_clock::now() + settings.limits.queueTime;
+    const bool returnsList = cimxml::Operations::returnsList(exchange.headers.method);
+    Quota::Share list;
+    Quota::Share request;
+    if (returnsList && !list.take(lists, latest)) {
+        return unavailable(tooManyRequests);
+    }
+    if (returnsList && !exchange.unfinished.take(results, latest)) {
+        return unavailable("Other clients have not received their results yet.");
+    }
+    if (!request.take(requests, latest)) {
+        return unavailable(tooManyRequests);
+    }
+    return perform(exchange);
 }
 
 Reply RequestHandler::perform(Exchange& exchange) {
@@ -154,7 +170,14 @@ Reply RequestHandler::perform(Exchange& exchange) {
         return *disagreement;
     }
     exchange.record.className = cimxml::Operations::subjectOf(message);
-    return begun(exchange, respond(exchange, message));
+    const auto text = std::make_shared<cimxml::ResponseText>(respond(exchange, message));
+    exchange.record.objects = text->count();
+    CimReply reply{text};
+    reply.isComplete = !text->append(reply.beginning, blockSize);
+    if (cimxml::Operations::returnsList(message.method)) {
+        exchange.unfinished.resize(reply.isComplete ? 0 : text->count());
+    }
+    return reply;
 }
 
 cimxml::ResponseText RequestHandler::respond(Exchange& exchange, const cimxml::Message& message) {
@@ -171,23 +194,6 @@ cimxml::ResponseText RequestHandler::respond(Exchange& exchange, const cimxml::M
     } catch (const std::exception& error) {
         return failed({CMPI_RC_ERR_FAILED, error.what()});
     }
-}
-
-/** A long response holds its results until the client has received it: those of all clients together are limited. */
-Reply RequestHandler::begun(Exchange& exchange, cimxml::ResponseText text) {
-    struct Unfinished {
-        explicit Unfinished(cimxml::ResponseText itsText) : text(std::move(itsText)) {}
-        cimxml::ResponseText text;
-        std::optional<Quota::Share> share{};
-    };
-    const auto response = std::make_shared<Unfinished>(std::move(text));
-    CimReply reply{{response, &response->text}};
-    reply.isComplete = !reply.text->append(reply.beginning, blockSize);
-    if (!reply.isComplete && !response->share.emplace(results, reply.text->count(), settings.limits.queueTime)) {
-        return unavailable("Other clients have not received their results yet.");
-    }
-    exchange.record.objects = reply.text->count();
-    return reply;
 }
 
 void RequestHandler::log(Exchange& exchange, unsigned httpStatus) const {

@@ -34,6 +34,7 @@ struct Exchange {
     bool isBodyIgnored = false;             ///< whether the response is sent before the body has arrived
     std::optional<HttpResponse> refused{};  ///< the response to a body that is too large, once its rest has arrived
     std::size_t ignored = 0;                ///< bytes of the rest
+    Quota::Share unfinished{};              ///< the results of a list that the client has not received completely
     bool isLogged = false;
     AccessRecord record{};
     std::chrono::steady_clock::time_point start = std::chrono::steady_clock::now();
@@ -89,9 +90,9 @@ private:
     std::optional<HttpResponse> authenticate(Exchange& exchange, const HttpRequest& request);
     std::optional<Right> verified(Exchange& exchange, const std::string& authorization);
     Reply answer(Exchange& exchange);
+    Reply performInTurn(Exchange& exchange);
     Reply perform(Exchange& exchange);
     cimxml::ResponseText respond(Exchange& exchange, const cimxml::Message& message);
-    Reply begun(Exchange& exchange, cimxml::ResponseText text);
 
     const Settings& settings;
     cimxml::Operations& operations;
@@ -99,6 +100,7 @@ private:
     PasswordQueue passwords;  ///< for calls of the authenticator
     const AccessLog& accessLog;
     Quota requests;  ///< at work
+    Quota lists;     ///< that are made, or wait for results
     Quota results;   ///< of unfinished responses
     std::atomic<bool> stopping{false};
 };

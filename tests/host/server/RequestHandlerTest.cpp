@@ -1,6 +1,9 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <future>
+#include <thread>
+
 #include "ServerFixture.h"
 #include "TcpPair.h"
 #include "server/RequestHandler.h"
@@ -16,6 +19,10 @@ protected:
     std::string status(const HttpRequest& request, const std::string& content) {
         Exchange exchange;
         exchange.connection = &connection;
+        return status(exchange, request, content);
+    }
+
+    std::string status(Exchange& exchange, const HttpRequest& request, const std::string& content) {
         exchange.rules = {false, settings.limits.requestBytes};
         if (const auto refused = handler().begin(exchange, request)) {
             return std::to_string(refused->status);
@@ -148,6 +155,34 @@ TEST_F(RequestHandlerTest, RequestsAtWorkAreLimited) {
     });
     EXPECT_EQ(list(reader), "200/0");
     EXPECT_EQ(during, "503");
+}
+
+TEST_F(RequestHandlerTest, ShortRequestsDoNotWaitForListsThatOthersReceive) {
+    settings.limits.requestsAtWork = 1;
+    settings.limits.responseResults = 1;
+    settings.limits.queueTime = std::chrono::seconds(10);
+    const Instance large{{"", "root/test", "Thing", {{"Name", Value::of(std::string(100'000, 'a'))}}}, {}};
+    manager.answerWith([&](const Request&) { return Response::ofInstances({large}); });
+    const auto listFor = [&](Exchange& exchange) {
+        return status(exchange, head("EnumerateInstances", reader),
+                      body("EnumerateInstances", "ClassName", "<CLASSNAME NAME=\"Thing\"/>"));
+    };
+    Exchange slow;
+    slow.connection = &connection;
+    EXPECT_EQ(listFor(slow), "200/0");
+    Connection other{-1, false};
+    std::future<std::string> waiting = std::async(std::launch::async, [&] {
+        Exchange exchange;
+        exchange.connection = &other;
+        return listFor(exchange);
+    });
+    while (!handler().isShortOfResults()) {
+        std::this_thread::yield();
+    }
+    EXPECT_EQ(remove(writer), "200/0");
+    EXPECT_EQ(waiting.wait_for(std::chrono::seconds(0)), std::future_status::timeout);
+    slow.unfinished.resize(0);
+    EXPECT_EQ(waiting.get(), "200/0");
 }
 
 TEST_F(RequestHandlerTest, AServerThatStopsAcceptsNoRequests) {
