@@ -8,6 +8,8 @@
 
 namespace cimhost::cimxml {
 
+constexpr unsigned notImplemented = 501;  ///< HTTP status of requests that this server does not support
+
 /** An operation that fails with a CIM status. */
 class CimError : public std::runtime_error {
 public:

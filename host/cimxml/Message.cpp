@@ -10,14 +10,13 @@ namespace cimhost::cimxml {
 namespace {
 
 constexpr unsigned badRequest = 400;
-constexpr unsigned notImplemented = 501;
 
 [[noreturn]] void notLooselyValid(const std::string& why) {
     throw RequestRefused(badRequest, "request-not-loosely-valid", why);
 }
 
 /** The only child element of that name. */
-const XmlElement& childOf(const XmlElement& parent, std::string_view name) {
+const XmlElement& onlyChild(const XmlElement& parent, std::string_view name) {
     const XmlElement* child = parent.child(name);
     if (child == nullptr) {
         notLooselyValid("Element " + parent.name + " has no " + std::string(name) + ".");
@@ -29,7 +28,7 @@ const XmlElement& childOf(const XmlElement& parent, std::string_view name) {
     return *child;
 }
 
-const std::string& attributeOf(const XmlElement& element, std::string_view name) {
+const std::string& requiredAttribute(const XmlElement& element, std::string_view name) {
     const std::string* value = element.attribute(name);
     if (value == nullptr) {
         notLooselyValid("Element " + element.name + " has no attribute " + std::string(name) + ".");
@@ -39,7 +38,7 @@ const std::string& attributeOf(const XmlElement& element, std::string_view name)
 
 /** Accepts versions of a major number, "2.x"; later minor versions are compatible. */
 void checkVersion(const XmlElement& element, std::string_view attribute, char major, const char* error) {
-    const std::string& version = attributeOf(element, attribute);
+    const std::string& version = requiredAttribute(element, attribute);
     const bool isKnown = version.size() > 2 && version[0] == major && version[1] == '.' &&
                          std::all_of(version.begin() + 2, version.end(),
                                      [](unsigned char digit) { return std::isdigit(digit) != 0 || digit == '.'; });
@@ -57,7 +56,7 @@ const XmlElement& requestOf(const XmlElement& message) {
     if (message.child("SIMPLEEXPREQ") != nullptr || message.child("MULTIEXPREQ") != nullptr) {
         throw RequestRefused(notImplemented, "unsupported-operation", "Export messages are not supported.");
     }
-    return childOf(message, "SIMPLEREQ");
+    return onlyChild(message, "SIMPLEREQ");
 }
 
 void readParameters(Message& message, const XmlElement& call, std::string_view elementName) {
@@ -65,7 +64,7 @@ void readParameters(Message& message, const XmlElement& call, std::string_view e
         if (each.name != elementName) {
             continue;
         }
-        const std::string& name = attributeOf(each, "NAME");
+        const std::string& name = requiredAttribute(each, "NAME");
         if (each.children.size() > 1) {
             notLooselyValid("Parameter " + name + " has more than one value.");
         }
@@ -78,11 +77,11 @@ void readTarget(Message& message, const XmlElement& call) {
     const XmlElement* path = call.child("LOCALCLASSPATH");
     const bool isClass = path != nullptr;
     if (!isClass) {
-        path = &childOf(call, "LOCALINSTANCEPATH");
+        path = &onlyChild(call, "LOCALINSTANCEPATH");
     }
-    message.nameSpace = nameSpaceOf(childOf(*path, "LOCALNAMESPACEPATH"));
-    message.target = childOf(*path, isClass ? "CLASSNAME" : "INSTANCENAME");
-    message.object = message.nameSpace + ":" + attributeOf(message.target, isClass ? "NAME" : "CLASSNAME");
+    message.nameSpace = nameSpaceOf(onlyChild(*path, "LOCALNAMESPACEPATH"));
+    message.target = onlyChild(*path, isClass ? "CLASSNAME" : "INSTANCENAME");
+    message.object = message.nameSpace + ":" + requiredAttribute(message.target, isClass ? "NAME" : "CLASSNAME");
 }
 
 void readCall(Message& message, const XmlElement& request) {
@@ -90,10 +89,10 @@ void readCall(Message& message, const XmlElement& request) {
     if (message.isIntrinsic && request.child("METHODCALL") != nullptr) {
         notLooselyValid("Element SIMPLEREQ has more than one operation.");
     }
-    const XmlElement& call = childOf(request, message.isIntrinsic ? "IMETHODCALL" : "METHODCALL");
-    message.method = attributeOf(call, "NAME");
+    const XmlElement& call = onlyChild(request, message.isIntrinsic ? "IMETHODCALL" : "METHODCALL");
+    message.method = requiredAttribute(call, "NAME");
     if (message.isIntrinsic) {
-        message.nameSpace = nameSpaceOf(childOf(call, "LOCALNAMESPACEPATH"));
+        message.nameSpace = nameSpaceOf(onlyChild(call, "LOCALNAMESPACEPATH"));
         message.object = message.nameSpace;
         readParameters(message, call, "IPARAMVALUE");
         return;
@@ -114,7 +113,7 @@ std::string nameSpaceOf(const XmlElement& localNameSpacePath) {
     std::string nameSpace;
     for (const XmlElement& each : localNameSpacePath.children) {
         if (each.name == "NAMESPACE") {
-            nameSpace += (nameSpace.empty() ? "" : "/") + attributeOf(each, "NAME");
+            nameSpace += (nameSpace.empty() ? "" : "/") + requiredAttribute(each, "NAME");
         }
     }
     if (nameSpace.empty()) {
@@ -135,11 +134,11 @@ Message readMessage(std::string_view document, const XmlLimits& limits) {
     }
     checkVersion(root, "CIMVERSION", '2', "unsupported-cim-version");
     checkVersion(root, "DTDVERSION", '2', "unsupported-dtd-version");
-    const XmlElement& element = childOf(root, "MESSAGE");
+    const XmlElement& element = onlyChild(root, "MESSAGE");
     checkVersion(element, "PROTOCOLVERSION", '1', "unsupported-protocol-version");
     Message message;
-    message.id = attributeOf(element, "ID");
-    message.protocolVersion = attributeOf(element, "PROTOCOLVERSION");
+    message.id = requiredAttribute(element, "ID");
+    message.protocolVersion = requiredAttribute(element, "PROTOCOLVERSION");
     readCall(message, requestOf(element));
     return message;
 }

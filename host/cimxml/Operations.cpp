@@ -9,8 +9,6 @@
 namespace cimhost::cimxml {
 namespace {
 
-constexpr unsigned notImplemented = 501;
-
 const std::string* findName(const std::vector<std::string>& names, std::string_view name) {
     const auto found =
         std::find_if(names.begin(), names.end(), [&](const std::string& each) { return cim::sameName(each, name); });

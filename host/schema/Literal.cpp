@@ -94,8 +94,8 @@ Scalar dateTimeScalar(const Literal& literal, CMPIType type) {
     return DateTime{string};
 }
 
-Scalar reference(const Literal& literal, const Property& property, const Schema& schema,
-                 const std::string& defaultNameSpace) {
+Scalar referenceFrom(const Literal& literal, const Property& property, const Schema& schema,
+                     const std::string& defaultNameSpace) {
     const auto* uri = std::get_if<std::string>(&literal.value);
     if (uri == nullptr) {
         throw ValueError(literal.source + " is not a reference: write the path of a " + property.referenceClass +
@@ -158,7 +158,7 @@ Scalar typedScalar(const Literal& literal, CMPIType type) {
 Scalar typedElement(const Literal& literal, const Property& property, const Schema& schema,
                     const std::string& defaultNameSpace) {
     if (property.type == CMPI_ref && !std::holds_alternative<std::monostate>(literal.value)) {
-        return reference(literal, property, schema, defaultNameSpace);
+        return referenceFrom(literal, property, schema, defaultNameSpace);
     }
     return typedScalar(literal, property.type);
 }
