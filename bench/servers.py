@@ -2,8 +2,9 @@
 """Measures CIM servers with wrk, side by side, and prints a Markdown table.
 
 Each cell has the median time of a request in milliseconds and the requests per second, of the best of several rounds:
-in each round, all servers are measured one after the other, so that other load of the machine affects all. The servers
-must serve the same leases in root/cimv2, without authentication. The leases that CreateInstance makes are deleted.
+in each round, all servers are measured one after the other, so that other load of the machine affects all. Each begins
+once the processors are idle, since a server may still work on requests whose client has ended. The servers must serve
+the same leases in root/cimv2, without authentication. The leases that CreateInstance makes are deleted.
 
 With --baseline, the program http_baseline sends the responses of the first server from memory.
 """
@@ -17,6 +18,7 @@ import re
 import subprocess
 import sys
 import tempfile
+import time
 import urllib.parse
 
 HERE = pathlib.Path(__file__).resolve().parent
@@ -39,6 +41,20 @@ def call(operation, parameters):
             f'PROTOCOLVERSION="1.0"><SIMPLEREQ><IMETHODCALL NAME="{operation}"><LOCALNAMESPACEPATH><NAMESPACE '
             f'NAME="root"/><NAMESPACE NAME="cimv2"/></LOCALNAMESPACEPATH>{parameters}</IMETHODCALL></SIMPLEREQ>'
             '</MESSAGE></CIM>')
+
+
+def idle_seconds():
+    """Returns the time that all processors together have been idle."""
+    return float(pathlib.Path("/proc/uptime").read_text().split()[1])
+
+
+def wait_until_idle(processors=os.cpu_count(), interval=0.2, longest=60):
+    end = time.monotonic() + longest
+    share = 0
+    while share < 0.9 and time.monotonic() < end:
+        begin, before = time.monotonic(), idle_seconds()
+        time.sleep(interval)
+        share = (idle_seconds() - before) / (time.monotonic() - begin) / processors
 
 
 class Server:
@@ -74,6 +90,7 @@ class Server:
         with tempfile.NamedTemporaryFile("w", suffix=".xml") as body:
             body.write(call(operation, parameters))
             body.flush()
+            wait_until_idle()
             ended = subprocess.run(
                 ["wrk", "-t1", f"-c{connections}", f"-d{seconds}s", "--timeout", "60s", "-s", HERE / "servers.lua", self.url],
                 env={**os.environ, "CIM_METHOD": operation, "CIM_BODY": body.name}, check=True, capture_output=True,
