@@ -18,11 +18,7 @@ public:
     class Share {
     public:
         Share() = default;
-        ~Share() {
-            if (quota != nullptr) {
-                quota->change(amount, 0);
-            }
-        }
+        ~Share() { resize(0); }
         Share(const Share&) = delete;
         Share& operator=(const Share&) = delete;
 
@@ -35,10 +31,12 @@ public:
             return quota != nullptr;
         }
 
-        /** Changes the amount of a share that was taken, without waiting: it may exceed the limit. */
+        /** Changes the amount without waiting: it may exceed the limit. A share that was not taken stays nothing. */
         void resize(std::size_t size) {
-            quota->change(amount, size);
-            amount = size;
+            if (quota != nullptr) {
+                quota->change(amount, size);
+                amount = size;
+            }
         }
 
     private:

@@ -9,7 +9,6 @@ constexpr std::chrono::seconds authorizationLifetime{60};
 constexpr unsigned badRequest = 400;
 constexpr unsigned timeout = 408;
 constexpr std::size_t patience = 4;  ///< multiple of the largest request that is received although it is refused
-constexpr char tooManyRequests[] = "The server has too many requests.";
 
 HttpResponse unauthorized() {
     HttpResponse response = refusal(401, "Send the name and password of a user who may use this server.");
@@ -32,7 +31,7 @@ RequestHandler::RequestHandler(const Settings& itsSettings, cimxml::Operations& 
       authenticator(itsAuthenticator),
       accessLog(itsLog),
       requests(itsSettings.limits.requestsAtWork),
-      lists(itsSettings.limits.requestsAtWork),
+      lists(itsSettings.limits.listsAtWork),
       results(itsSettings.limits.responseResults) {}
 
 std::optional<HttpResponse> RequestHandler::begin(Exchange& exchange, const HttpRequest& request) {
@@ -142,25 +141,25 @@ Reply RequestHandler::answer(Exchange& exchange) {
     }
 }
 
-/** A list waits for the results of others before it takes a place among all requests, so that short ones need not. */
+/**
+ * Lists have other places than short requests, which otherwise would wait for their results. While it waits for the
+ * results of others, a list keeps its place.
+ */
 Reply RequestHandler::performInTurn(Exchange& exchange) {
     const auto latest = std::chrono::steady_clock::now() + settings.limits.queueTime;
     const bool returnsList = cimxml::Operations::returnsList(exchange.headers.method);
-    Quota::Share list;
-    Quota::Share request;
-    if (returnsList && !list.take(lists, latest)) {
-        return unavailable(tooManyRequests);
+    Quota::Share place;
+    if (!place.take(returnsList ? lists : requests, latest)) {
+        return unavailable("The server has too many requests.");
     }
     if (returnsList && !exchange.unfinished.take(results, latest)) {
         return unavailable("Other clients have not received their results yet.");
     }
-    if (!request.take(requests, latest)) {
-        return unavailable(tooManyRequests);
-    }
-    return perform(exchange);
+    return perform(exchange, place);
 }
 
-Reply RequestHandler::perform(Exchange& exchange) {
+/** Leaves the place before it writes: while a thread writes, another can perform its request. */
+Reply RequestHandler::perform(Exchange& exchange, Quota::Share& place) {
     cimxml::XmlLimits limits;
     limits.depth = settings.limits.xmlDepth;
     limits.elements = settings.limits.xmlElements;
@@ -172,10 +171,12 @@ Reply RequestHandler::perform(Exchange& exchange) {
     exchange.record.className = cimxml::Operations::subjectOf(message);
     const auto text = std::make_shared<cimxml::ResponseText>(respond(exchange, message));
     exchange.record.objects = text->count();
+    exchange.unfinished.resize(text->count());
+    place.resize(0);
     CimReply reply{text};
     reply.isComplete = !text->append(reply.beginning, blockSize);
-    if (cimxml::Operations::returnsList(message.method)) {
-        exchange.unfinished.resize(reply.isComplete ? 0 : text->count());
+    if (reply.isComplete) {
+        exchange.unfinished.resize(0);
     }
     return reply;
 }

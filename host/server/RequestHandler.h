@@ -91,7 +91,7 @@ private:
     std::optional<Right> verified(Exchange& exchange, const std::string& authorization);
     Reply answer(Exchange& exchange);
     Reply performInTurn(Exchange& exchange);
-    Reply perform(Exchange& exchange);
+    Reply perform(Exchange& exchange, Quota::Share& place);
     cimxml::ResponseText respond(Exchange& exchange, const cimxml::Message& message);
 
     const Settings& settings;
@@ -99,8 +99,8 @@ private:
     Authenticator& authenticator;
     PasswordQueue passwords;  ///< for calls of the authenticator
     const AccessLog& accessLog;
-    Quota requests;  ///< at work
-    Quota lists;     ///< that are made, or wait for results
+    Quota requests;  ///< at work, except for lists
+    Quota lists;     ///< at work
     Quota results;   ///< of unfinished responses
     std::atomic<bool> stopping{false};
 };

@@ -256,7 +256,7 @@ TEST_F(HttpServerTest, IdleConnectionsEnd) {
 }
 
 TEST_F(HttpServerTest, ARequestThatWaitsTooLongForOthersIsRefused) {
-    settings.limits.requestsAtWork = 1;
+    settings.limits.listsAtWork = 1;
     settings.limits.queueTime = 0s;
     OtherOperation other(*this);
     const Socket client = connect();
@@ -288,7 +288,7 @@ TEST_F(HttpServerTest, APasswordThatWaitsTooLongForOthersIsNotChecked) {
 }
 
 TEST_F(HttpServerTest, ARequestWaitsForOthersAtWork) {
-    settings.limits.requestsAtWork = 1;
+    settings.limits.listsAtWork = 1;
     settings.limits.queueTime = 1h;
     OtherOperation other(*this);
     const Socket client = connect();

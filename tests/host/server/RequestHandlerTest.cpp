@@ -145,20 +145,21 @@ TEST_F(RequestHandlerTest, BodiesThatAreTooLargeAreIgnoredUpToALimit) {
     EXPECT_EQ(status(head("EnumerateInstanceNames", reader), std::string(8001, ' ')), "ended");
 }
 
-TEST_F(RequestHandlerTest, RequestsAtWorkAreLimited) {
-    settings.limits.requestsAtWork = 1;
+TEST_F(RequestHandlerTest, ListsAndOtherRequestsAtWorkAreLimited) {
+    settings.limits.listsAtWork = 1;
     settings.limits.queueTime = std::chrono::seconds(0);
-    std::string during;
-    manager.answerWith([&](const Request&) {
-        during = list(reader);
+    std::vector<std::string> during;
+    manager.answerWith([&](const Request& request) {
+        const bool isList = request.operation == Operation::enumerateInstanceNames;
+        during.push_back(isList ? list(reader) : remove(writer));
+        during.push_back(isList ? remove(writer) : list(reader));
         return Response{};
     });
     EXPECT_EQ(list(reader), "200/0");
-    EXPECT_EQ(during, "503");
+    EXPECT_THAT(during, testing::ElementsAre("503", "503", "503", "200/0"));
 }
 
 TEST_F(RequestHandlerTest, ShortRequestsDoNotWaitForListsThatOthersReceive) {
-    settings.limits.requestsAtWork = 1;
     settings.limits.responseResults = 1;
     settings.limits.queueTime = std::chrono::seconds(10);
     const Instance large{{"", "root/test", "Thing", {{"Name", Value::of(std::string(100'000, 'a'))}}}, {}};

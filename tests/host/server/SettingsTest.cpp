@@ -71,6 +71,8 @@ enumeration_seconds = 20
 enumeration_default_seconds = 10
 pull_objects = 8
 response_results = 9
+lists_at_work = 10
+requests_at_work = 11
 failure_milliseconds = 0
 )");
     ASSERT_EQ(settings.listeners.size(), 2U);
@@ -87,6 +89,8 @@ failure_milliseconds = 0
     EXPECT_EQ(settings.limits.enumerations.timeout.count(), 10);
     EXPECT_EQ(settings.limits.enumerations.mostObjects, 8U);
     EXPECT_EQ(settings.limits.responseResults, 9U);
+    EXPECT_EQ(settings.limits.listsAtWork, 10U);
+    EXPECT_EQ(settings.limits.requestsAtWork, 11U);
     EXPECT_EQ(settings.limits.failureDelay.count(), 0);
 }
 
