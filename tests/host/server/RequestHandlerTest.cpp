@@ -134,6 +134,7 @@ TEST_F(RequestHandlerTest, RequestsThatEndBeforeTheirResponseAreLogged) {
 }
 
 TEST_F(RequestHandlerTest, BodiesThatAreTooLargeAreIgnoredUpToALimit) {
+    EXPECT_EQ(status(head("EnumerateInstanceNames", reader), std::string(2000, ' ')), "400");
     EXPECT_EQ(status(head("EnumerateInstanceNames", reader), std::string(2001, ' ')), "413");
     EXPECT_EQ(status(head("EnumerateInstanceNames", reader), std::string(8001, ' ')), "ended");
 }
@@ -148,6 +149,31 @@ TEST_F(RequestHandlerTest, RequestsAtWorkAreLimited) {
     });
     EXPECT_EQ(list(reader), "200/0");
     EXPECT_EQ(during, "503");
+}
+
+TEST_F(RequestHandlerTest, AsManyRequestsAsConfiguredRunAtTheSameTime) {
+    settings.limits.requestsAtWork = 2;
+    settings.limits.queueTime = std::chrono::seconds(0);
+    std::vector<std::string> inner;
+    manager.answerWith([&, depth = std::make_shared<int>(0)](const Request&) {
+        if (++*depth < 4) {
+            inner.push_back(list(reader));
+        }
+        return Response{};
+    });
+    EXPECT_EQ(list(reader), "200/0");
+    EXPECT_THAT(inner, testing::ElementsAre("503", "200/0"));
+}
+
+TEST_F(RequestHandlerTest, DocumentsAreLimitedInDepthAndNumberOfElements) {
+    settings.limits.xmlDepth = 6;  // as the request
+    settings.limits.xmlElements = 9;
+    EXPECT_EQ(list(reader), "200/0");
+    settings.limits.xmlElements = 8;
+    EXPECT_EQ(list(reader), "400");
+    settings.limits.xmlElements = 9;
+    settings.limits.xmlDepth = 5;
+    EXPECT_EQ(list(reader), "400");
 }
 
 TEST_F(RequestHandlerTest, AServerThatStopsAcceptsNoRequests) {
