@@ -417,4 +417,24 @@ TEST_F(HttpServerTest, AConnectionThatIsClosedWithoutARequestIsNotLogged) {
     EXPECT_THAT(log(), testing::MatchesRegex("[^\n]* reader EnumerateInstances Thing 200/0 [^\n]*\n"));
 }
 
+TEST_F(HttpServerTest, ARefusedRequestWhoseBodyGoesOnIsLoggedOnce) {
+    constexpr int count = 40;
+    settings.authenticates = false;
+    for (int i = 0; i < count; ++i) {
+        std::string request = requestOf("", false);
+        const std::size_t length = request.find("Content-Length");
+        request.replace(length, request.find("\r\n", length) - length,
+                        i % 2 == 0 ? "Content-Length: 1000000000" : "Transfer-Encoding: chunked");
+        const Socket client = connect();
+        client.send(request + "3B9ACA00\r\n");
+        const std::string part(100, ' ');
+        while (::send(client.get(), part.data(), part.size(), MSG_NOSIGNAL) > 0) {
+        }
+    }
+    running.reset();
+    const std::string lines = log();
+    EXPECT_EQ(std::count(lines.begin(), lines.end(), '\n'), count) << lines;
+    EXPECT_THAT(lines, testing::Not(HasSubstr(" 400/0 ")));
+}
+
 }  // namespace
