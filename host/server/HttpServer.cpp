@@ -153,7 +153,7 @@ struct HttpServer::Endpoint {
         if (exchange->isBodyIgnored) {
             discardInput(connection.socket(), handler.mostIgnored());
         }
-        // What still arrives belongs to the body of this request, not to the head of another.
+        // Bytes that still arrive belong to the body of this request, not to the head of another.
         const bool isLast = exchange->isBodyIgnored || code != MHD_REQUEST_TERMINATED_COMPLETED_OK;
         connection.enter(isLast ? Connection::Phase::refusal : Connection::Phase::idle);
     }

@@ -417,7 +417,7 @@ TEST_F(HttpServerTest, AConnectionThatIsClosedWithoutARequestIsNotLogged) {
     EXPECT_THAT(log(), testing::MatchesRegex("[^\n]* reader EnumerateInstances Thing 200/0 [^\n]*\n"));
 }
 
-TEST_F(HttpServerTest, ARefusedRequestWhoseBodyGoesOnIsLoggedOnce) {
+TEST_F(HttpServerTest, ARefusedRequestWhoseBodyStillArrivesIsLoggedOnce) {
     constexpr int count = 40;
     settings.authenticates = false;
     for (int i = 0; i < count; ++i) {
