@@ -109,7 +109,8 @@ public:
         parser = borrowed.get();
         // Without XML_PARSE_NOENT, ampersands of attributes would remain encoded. There are no entities to declare.
         // A declared encoding such as UTF-7 could hide attributes from requireFewAttributes().
-        xmlCtxtUseOptions(parser, XML_PARSE_NONET | XML_PARSE_NOENT | XML_PARSE_IGNORE_ENC);
+        // Without XML_PARSE_HUGE, documents of more than 10 MB would be refused, whatever the limit of requests is.
+        xmlCtxtUseOptions(parser, XML_PARSE_NONET | XML_PARSE_NOENT | XML_PARSE_IGNORE_ENC | XML_PARSE_HUGE);
         const int result = xmlParseChunk(parser, document.data(), static_cast<int>(document.size()), 1);
         if (refusal) {
             throw XmlError(*refusal + " (line " + std::to_string(refusedLine) + ")");

@@ -139,7 +139,7 @@ struct HttpServer::Endpoint {
         }
     }
 
-    static void notifyCompleted(void* self, MHD_Connection*, void** context, MHD_RequestTerminationCode) {
+    static void notifyCompleted(void* self, MHD_Connection*, void** context, MHD_RequestTerminationCode code) {
         const std::unique_ptr<Exchange> exchange(static_cast<Exchange*>(*context));
         *context = nullptr;
         if (exchange == nullptr) {  // there was no memory for it
@@ -153,7 +153,9 @@ struct HttpServer::Endpoint {
         if (exchange->isBodyIgnored) {
             discardInput(connection.socket(), handler.mostIgnored());
         }
-        connection.enter(Connection::Phase::idle);
+        // Bytes that still arrive belong to the body of this request, not to the head of another.
+        const bool isLast = exchange->isBodyIgnored || code != MHD_REQUEST_TERMINATED_COMPLETED_OK;
+        connection.enter(isLast ? Connection::Phase::refusal : Connection::Phase::idle);
     }
 
     static MHD_Result handle(void* self, MHD_Connection* connection, const char*, const char* method, const char*,

@@ -79,6 +79,12 @@ TEST(XmlElementTest, DepthAndNumberOfElementsAreLimited) {
     EXPECT_THAT(reasonFor("<A><B/><B/><B/></A>", {5, 3}), HasSubstr("more than 3 elements"));
 }
 
+TEST(XmlElementTest, LargeDocumentsAreRead) {
+    const std::string characters(std::size_t{20} << 20U, 'a');
+    EXPECT_EQ(parseXml("<A B='" + characters + "'>" + characters + "</A>").characters.size(), characters.size());
+    EXPECT_EQ(reasonFor("<A><!--" + characters + "--><?p " + characters + "?></A>"), "accepted");
+}
+
 TEST(XmlWriterTest, EscapesWithNamedEntitiesOnly) {
     std::string xml;
     appendEscaped(xml, "a<b>&\"c'\n\xC3\xA4");

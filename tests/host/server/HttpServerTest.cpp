@@ -367,4 +367,75 @@ TEST_F(HttpServerTest, AServerThatStopsRefusesConnections) {
     EXPECT_NE(::connect(client.get(), reinterpret_cast<const sockaddr*>(&address), sizeof address), 0);
 }
 
+TEST_F(HttpServerTest, AWrongPasswordIsAnsweredAfterTheDelay) {
+    settings.limits.failureDelay = 50ms;
+    const Socket client = connect();
+    const auto start = std::chrono::steady_clock::now();
+    client.send(requestOf(wrong));
+    EXPECT_THAT(client.receiveUntil("\r\n\r\n"), StartsWith("HTTP/1.1 401 "));
+    EXPECT_GE(std::chrono::steady_clock::now() - start, settings.limits.failureDelay);
+}
+
+TEST_F(HttpServerTest, ResultsOfOpenEnumerationsAreLimited) {
+    settings.limits.enumerations.results = 3;
+    manager.answerWith([](const Request&) {
+        const Instance instance{{"", "root/test", "Thing", {{"Name", Value::of(std::string("a"))}}}, {}};
+        return Response::ofInstances({instance, instance});
+    });
+    const Socket client = connect();
+    const auto open = [&] {
+        client.send(requestOf(reader, true, "OpenEnumerateInstances"));
+        return client.receiveUntil("</CIM>\n");
+    };
+    EXPECT_THAT(open(), HasSubstr("EnumerationContext"));
+    EXPECT_THAT(open(), testing::AllOf(StartsWith("HTTP/1.1 200 "), HasSubstr("<ERROR CODE=\"27\" ")));
+    EXPECT_THAT(served(client), testing::AllOf(StartsWith("HTTP/1.1 200 "), testing::Not(HasSubstr("<ERROR "))));
+}
+
+TEST_F(HttpServerTest, LongResponsesAreSentUpToTheLimitOfTheirResults) {
+    settings.limits.responseResults = 4'000;
+    settings.limits.queueTime = 0s;
+    manager.answerWith([](const Request&) { return largeResponse(); });
+    const Socket first = slowReader();
+    const Socket second = slowReader();
+    const Socket refused = connect();
+    refused.send(requestOf(reader));
+    EXPECT_THAT(refused.receiveUntil("\r\n\r\n"), StartsWith("HTTP/1.1 503 "));
+}
+
+TEST_F(HttpServerTest, AConnectionThatIsClosedWithoutARequestIsNotLogged) {
+    for (int i = 0; i < 20; ++i) {
+        connect().close();
+        const Socket aborted = connect();
+        const linger abort{1, 0};
+        EXPECT_EQ(::setsockopt(aborted.get(), SOL_SOCKET, SO_LINGER, &abort, sizeof abort), 0);
+    }
+    const Socket halfClosed = connect();
+    EXPECT_EQ(::shutdown(halfClosed.get(), SHUT_WR), 0);
+    EXPECT_EQ(halfClosed.receive(), "");
+    EXPECT_THAT(served(connect()), StartsWith("HTTP/1.1 200 "));
+    running.reset();
+    EXPECT_THAT(log(), testing::MatchesRegex("[^\n]* reader EnumerateInstances Thing 200/0 [^\n]*\n"));
+}
+
+TEST_F(HttpServerTest, ARefusedRequestWhoseBodyStillArrivesIsLoggedOnce) {
+    constexpr int count = 40;
+    settings.authenticates = false;
+    for (int i = 0; i < count; ++i) {
+        std::string request = requestOf("", false);
+        const std::size_t length = request.find("Content-Length");
+        request.replace(length, request.find("\r\n", length) - length,
+                        i % 2 == 0 ? "Content-Length: 1000000000" : "Transfer-Encoding: chunked");
+        const Socket client = connect();
+        client.send(request + "3B9ACA00\r\n");
+        const std::string part(100, ' ');
+        while (::send(client.get(), part.data(), part.size(), MSG_NOSIGNAL) > 0) {
+        }
+    }
+    running.reset();
+    const std::string lines = log();
+    EXPECT_EQ(std::count(lines.begin(), lines.end(), '\n'), count) << lines;
+    EXPECT_THAT(lines, testing::Not(HasSubstr(" 400/0 ")));
+}
+
 }  // namespace

@@ -141,6 +141,7 @@ TEST_F(RequestHandlerTest, RequestsThatEndBeforeTheirResponseAreLogged) {
 }
 
 TEST_F(RequestHandlerTest, BodiesThatAreTooLargeAreIgnoredUpToALimit) {
+    EXPECT_EQ(status(head("EnumerateInstanceNames", reader), std::string(2000, ' ')), "400");
     EXPECT_EQ(status(head("EnumerateInstanceNames", reader), std::string(2001, ' ')), "413");
     EXPECT_EQ(status(head("EnumerateInstanceNames", reader), std::string(8001, ' ')), "ended");
 }
@@ -184,6 +185,31 @@ TEST_F(RequestHandlerTest, ShortRequestsDoNotWaitForListsThatOthersReceive) {
     EXPECT_EQ(waiting.wait_for(std::chrono::seconds(0)), std::future_status::timeout);
     slow.unfinished.resize(0);
     EXPECT_EQ(waiting.get(), "200/0");
+}
+
+TEST_F(RequestHandlerTest, AsManyListsAsConfiguredRunAtTheSameTime) {
+    settings.limits.listsAtWork = 2;
+    settings.limits.queueTime = std::chrono::seconds(0);
+    std::vector<std::string> inner;
+    manager.answerWith([&, depth = std::make_shared<int>(0)](const Request&) {
+        if (++*depth < 4) {
+            inner.push_back(list(reader));
+        }
+        return Response{};
+    });
+    EXPECT_EQ(list(reader), "200/0");
+    EXPECT_THAT(inner, testing::ElementsAre("503", "200/0"));
+}
+
+TEST_F(RequestHandlerTest, DocumentsAreLimitedInDepthAndNumberOfElements) {
+    settings.limits.xmlDepth = 6;  // as the request
+    settings.limits.xmlElements = 9;
+    EXPECT_EQ(list(reader), "200/0");
+    settings.limits.xmlElements = 8;
+    EXPECT_EQ(list(reader), "400");
+    settings.limits.xmlElements = 9;
+    settings.limits.xmlDepth = 5;
+    EXPECT_EQ(list(reader), "400");
 }
 
 TEST_F(RequestHandlerTest, AServerThatStopsAcceptsNoRequests) {

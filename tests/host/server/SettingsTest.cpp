@@ -1,7 +1,10 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <cstdint>
 #include <fstream>
+#include <functional>
+#include <utility>
 
 #include "server/Settings.h"
 #include "support/Files.h"
@@ -49,7 +52,7 @@ TEST_F(SettingsTest, WithoutKeysOnlyRootMayWriteAndNoOtherUserRead) {
     EXPECT_TRUE(settings.listeners.empty());
 }
 
-TEST_F(SettingsTest, ReadsAllTables) {
+TEST_F(SettingsTest, ReadsTheTablesBesidesTheLimits) {
     const Settings settings = read(R"(
 access_log = "/var/log/cimhost.log"
 [[listen]]
@@ -62,18 +65,6 @@ key = "/k"
 [access]
 readers = ["alice", "@operators"]
 writers = []
-[limits]
-connections = 7
-head_seconds = 3
-open_enumerations = 5
-enumeration_results = 6
-enumeration_seconds = 20
-enumeration_default_seconds = 10
-pull_objects = 8
-response_results = 9
-lists_at_work = 10
-requests_at_work = 11
-failure_milliseconds = 0
 )");
     ASSERT_EQ(settings.listeners.size(), 2U);
     EXPECT_EQ(settings.listeners[0].url(), "http://127.0.0.1:5988");
@@ -81,17 +72,38 @@ failure_milliseconds = 0
     EXPECT_THAT(settings.access.readers, ElementsAre("alice", "@operators"));
     EXPECT_TRUE(settings.access.writers.empty());
     EXPECT_EQ(settings.certificate, "/c");
-    EXPECT_EQ(settings.limits.connections, 7U);
-    EXPECT_EQ(settings.limits.headTime.count(), 3);
-    EXPECT_EQ(settings.limits.enumerations.open, 5U);
-    EXPECT_EQ(settings.limits.enumerations.results, 6U);
-    EXPECT_EQ(settings.limits.enumerations.longestTimeout.count(), 20);
-    EXPECT_EQ(settings.limits.enumerations.timeout.count(), 10);
-    EXPECT_EQ(settings.limits.enumerations.mostObjects, 8U);
-    EXPECT_EQ(settings.limits.responseResults, 9U);
-    EXPECT_EQ(settings.limits.listsAtWork, 10U);
-    EXPECT_EQ(settings.limits.requestsAtWork, 11U);
-    EXPECT_EQ(settings.limits.failureDelay.count(), 0);
+}
+
+TEST_F(SettingsTest, EachKeyOfTheLimitsSetsItsOwnLimit) {
+    const std::vector<std::pair<std::string, std::function<std::int64_t(const Limits&)>>> keys{
+        {"connections", [](const Limits& limits) { return limits.connections; }},
+        {"connections_per_address", [](const Limits& limits) { return limits.connectionsPerAddress; }},
+        {"lists_at_work", [](const Limits& limits) { return limits.listsAtWork; }},
+        {"requests_at_work", [](const Limits& limits) { return limits.requestsAtWork; }},
+        {"queue_seconds", [](const Limits& limits) { return limits.queueTime.count(); }},
+        {"response_results", [](const Limits& limits) { return limits.responseResults; }},
+        {"request_bytes", [](const Limits& limits) { return limits.requestBytes; }},
+        {"xml_depth", [](const Limits& limits) { return limits.xmlDepth; }},
+        {"xml_elements", [](const Limits& limits) { return limits.xmlElements; }},
+        {"open_enumerations", [](const Limits& limits) { return limits.enumerations.open; }},
+        {"enumeration_results", [](const Limits& limits) { return limits.enumerations.results; }},
+        {"enumeration_seconds", [](const Limits& limits) { return limits.enumerations.longestTimeout.count(); }},
+        {"enumeration_default_seconds", [](const Limits& limits) { return limits.enumerations.timeout.count(); }},
+        {"pull_objects", [](const Limits& limits) { return limits.enumerations.mostObjects; }},
+        {"head_seconds", [](const Limits& limits) { return limits.headTime.count(); }},
+        {"body_seconds", [](const Limits& limits) { return limits.bodyTime.count(); }},
+        {"response_seconds", [](const Limits& limits) { return limits.responseTime.count(); }},
+        {"idle_seconds", [](const Limits& limits) { return limits.idleTime.count(); }},
+        {"stop_seconds", [](const Limits& limits) { return limits.stopTime.count(); }},
+        {"failure_milliseconds", [](const Limits& limits) { return limits.failureDelay.count(); }}};
+    std::string toml = "[limits]\n";
+    for (std::size_t i = 0; i < keys.size(); ++i) {
+        toml += keys[i].first + " = " + std::to_string(100 + i) + "\n";
+    }
+    const Limits limits = read(toml).limits;
+    for (std::size_t i = 0; i < keys.size(); ++i) {
+        EXPECT_EQ(keys[i].second(limits), static_cast<std::int64_t>(100 + i)) << keys[i].first;
+    }
 }
 
 TEST_F(SettingsTest, MistakesAreErrors) {
