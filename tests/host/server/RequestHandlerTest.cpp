@@ -151,6 +151,23 @@ TEST_F(RequestHandlerTest, RequestsAtWorkAreLimited) {
     EXPECT_EQ(during, "503");
 }
 
+TEST_F(RequestHandlerTest, PasswordsAndRequestsWaitForOthersBeforeTheyAreRefused) {
+    settings.limits.requestsAtWork = 1;
+    settings.limits.queueTime = std::chrono::seconds(1);
+    const auto waitInVain = [&] {
+        const auto start = std::chrono::steady_clock::now();
+        EXPECT_EQ(list(reader), "503");
+        EXPECT_GE(std::chrono::steady_clock::now() - start, settings.limits.queueTime);
+    };
+    authenticator.beforeAnswer = waitInVain;
+    manager.answerWith([&](const Request&) {
+        waitInVain();
+        return Response{};
+    });
+    EXPECT_EQ(list(reader), "200/0");
+    EXPECT_EQ(authenticator.asked, 1);
+}
+
 TEST_F(RequestHandlerTest, AsManyRequestsAsConfiguredRunAtTheSameTime) {
     settings.limits.requestsAtWork = 2;
     settings.limits.queueTime = std::chrono::seconds(0);
