@@ -123,8 +123,9 @@ bool Connection::isOverdue(const Limits& limits, Clock::time_point now) {
         case Phase::body:
             return age > limits.bodyTime;
         case Phase::response:
-        case Phase::refusal:
             return age > limits.responseTime;
+        case Phase::refusal:  // begins with the delay
+            return age > limits.failureDelay + limits.responseTime;
         default:
             break;
     }

@@ -200,6 +200,16 @@ TEST_F(ConnectionTableTest, EachPhaseHasALimit) {
     EXPECT_TRUE(work.isOpen());
 }
 
+TEST_F(ConnectionTableTest, ARefusalIsLimitedLikeAResponseAfterTheDelay) {
+    limits.failureDelay = 20s;
+    limits.responseTime = 10s;
+    const Added& refused = addIn(Phase::refusal);
+    endOverdueAfter(29s);
+    EXPECT_TRUE(refused.isOpen());
+    endOverdueAfter(31s);
+    EXPECT_EQ(refused.sockets.client.receive(), "");
+}
+
 TEST_F(ConnectionTableTest, AHandshakeIsLimitedLikeAHeadAndIsNotPartOfOne) {
     const Added& slow = add("a", true);
     const Added& ready = add("b", true);

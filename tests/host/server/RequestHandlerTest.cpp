@@ -160,6 +160,23 @@ TEST_F(RequestHandlerTest, ListsAndOtherRequestsAtWorkAreLimited) {
     EXPECT_THAT(during, testing::ElementsAre("503", "503", "503", "200/0"));
 }
 
+TEST_F(RequestHandlerTest, PasswordsAndRequestsWaitForOthersBeforeTheyAreRefused) {
+    settings.limits.listsAtWork = 1;
+    settings.limits.queueTime = std::chrono::seconds(1);
+    const auto waitInVain = [&] {
+        const auto start = std::chrono::steady_clock::now();
+        EXPECT_EQ(list(reader), "503");
+        EXPECT_GE(std::chrono::steady_clock::now() - start, settings.limits.queueTime);
+    };
+    authenticator.beforeAnswer = waitInVain;
+    manager.answerWith([&](const Request&) {
+        waitInVain();
+        return Response{};
+    });
+    EXPECT_EQ(list(reader), "200/0");
+    EXPECT_EQ(authenticator.asked, 1);
+}
+
 TEST_F(RequestHandlerTest, ShortRequestsDoNotWaitForListsThatOthersReceive) {
     settings.limits.responseResults = 1;
     settings.limits.queueTime = std::chrono::seconds(10);
