@@ -11,7 +11,7 @@ Name Name::declared(const std::string& name) {
     static auto& names = *new std::set<std::string>;  // never destroyed: names may be used until the process ends
     const std::lock_guard<std::mutex> lock(mutex);
     Name result;
-    result.kept = &*names.insert(name).first;
+    result.shared = {std::shared_ptr<void>(), &*names.insert(name).first};  // without an owner that is counted
     return result;
 }
 

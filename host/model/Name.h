@@ -1,6 +1,7 @@
 #pragma once
 
 #include <iosfwd>
+#include <memory>
 #include <string>
 #include <string_view>
 #include <type_traits>
@@ -9,19 +10,22 @@
 namespace cimhost {
 
 /**
- * The name of a key, a property or a parameter, with the letter case that its author used. Most names are those that
- * classes declare: these are stored once in the process, so that a copy needs no memory.
+ * The name of a key, a property or a parameter, with the letter case that its author used. Copies share its characters.
+ * Most names are those that classes declare: these are stored once in the process, and never counted or freed.
  */
 class Name {
 public:
     Name() = default;
-    Name(std::string itsName) : own(std::move(itsName)) {}
-    Name(const char* itsName) : own(itsName) {}
+    Name(std::string itsName) : shared(std::make_shared<const std::string>(std::move(itsName))) {}
+    Name(const char* itsName) : Name(std::string(itsName)) {}
 
     /** The same name as one that the process keeps. Only for names of classes, since it never frees them. */
     static Name declared(const std::string& name);
 
-    const std::string& string() const { return kept != nullptr ? *kept : own; }
+    const std::string& string() const {
+        static const std::string empty;
+        return shared == nullptr ? empty : *shared;
+    }
     operator const std::string&() const { return string(); }
     operator std::string_view() const { return string(); }
 
@@ -37,8 +41,7 @@ public:
     friend std::ostream& operator<<(std::ostream& stream, const Name& name);
 
 private:
-    std::string own{};
-    const std::string* kept = nullptr;  ///< if not null, used instead
+    std::shared_ptr<const std::string> shared{};  ///< null: empty
 };
 
 }  // namespace cimhost
