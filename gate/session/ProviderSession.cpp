@@ -78,7 +78,7 @@ ProviderSession::ProviderSession(const ClientRequest& itsRequest, Access access)
 template <auto function, class Interface, class... Arguments>
 ProviderAnswer ProviderSession::call(Interface* interface, const LocalObject& path, Arguments... arguments) const {
     ResultCollector result;
-    theConnection.wrappedBroker().forgetFailures();
+    theConnection.wrappedBroker().hasFailed = false;
     const CMPIStatus status =
         (interface->ft->*function)(interface, request.context, result.handle(), path.path(), arguments...);
     if (status.rc != CMPI_RC_OK) {
@@ -93,7 +93,7 @@ ProviderAnswer ProviderSession::call(Interface* interface, const LocalObject& pa
 template <auto function, class Interface, class... Arguments>
 ProviderAnswer ProviderSession::read(Interface* interface, const LocalObject& path, Arguments... arguments) const {
     ProviderAnswer answer = call<function>(interface, path, arguments...);
-    require(!theConnection.wrappedBroker().hasFailed(), "create the paths and instances of the answer");
+    require(!theConnection.wrappedBroker().hasFailed, "create the paths and instances of the answer");
     if (!answer.isDone) {
         failUnfinished();
     }
