@@ -3,7 +3,6 @@
 #include <cxxabi.h>
 #include <dlfcn.h>
 
-#include <algorithm>
 #include <chrono>
 #include <exception>
 #include <thread>
@@ -27,9 +26,6 @@ constexpr std::chrono::milliseconds pollInterval{10};
 
 /** How long a request waits for newer records if it may use older ones. A file's time has a resolution of 10 ms. */
 constexpr std::chrono::milliseconds newerTimeout{50};
-
-/** The classes of the record files, in their order. */
-constexpr std::array<const char*, durable::recordFileCount> recordClasses{"VELKO_Lease", "VELKO_Warranty"};
 
 /** Releases the lock while the condition holds, but not much longer than the timeout. */
 template <class Condition>
@@ -169,22 +165,19 @@ bool ProviderConnection::load() {
     if (!theDirectory.hasChanged()) {
         createInterfaces();
         isOutdated = false;
-        verified = 0;
-        read = 0;
+        for (Table& table : tables) {
+            table = {table.name};
+        }
     }
     return !isOutdated;
 }
 
-bool ProviderConnection::hasRead(const Class& owner, std::optional<std::size_t> count) {
-    const auto* const found = std::find_if(recordClasses.begin(), recordClasses.end(),
-                                           [&](const char* name) { return sameName(name, owner.name); });
-    if (found == recordClasses.end() || (read & bitOf(owner)) != 0) {
-        return true;
+void ProviderConnection::requireRead(const Class& owner, std::size_t count) {
+    if (hasRead(owner)) {
+        return;
     }
-    if (!count) {
-        return false;
-    }
-    const auto index = static_cast<std::size_t>(found - recordClasses.begin());
+    Table* const table = tableOf(owner);
+    const auto index = static_cast<std::size_t>(table - tables.data());
     if (!counts[index]) {  // the gate could not read the file, but the provider may have
         counts[index] = theDirectory.recordCounts()[index];
     }
@@ -193,8 +186,7 @@ bool ProviderConnection::hasRead(const Class& owner, std::optional<std::size_t> 
         fail(CMPI_RC_ERR_FAILED, std::string("The provider could not read the records of ") + owner.name +
                                      "; see the agent's log at level 3000. It reads them again; repeat the request.");
     }
-    read |= bitOf(owner);
-    return true;
+    table->isRead = true;
 }
 
 void ProviderConnection::unload() {
@@ -235,14 +227,14 @@ void ProviderConnection::shutdown(const CMPIContext* context) {
 
 bool ProviderConnection::isConnectedTo(const CMPIBroker* manager) const {
     const std::lock_guard<std::mutex> lock(mutex);
-    return managersOwn == manager && tables.bft == manager->bft && tables.eft == manager->eft &&
-           tables.xft == manager->xft && tables.mft == manager->mft;
+    return managersOwn == manager && brokersTables.bft == manager->bft && brokersTables.eft == manager->eft &&
+           brokersTables.xft == manager->xft && brokersTables.mft == manager->mft;
 }
 
 void ProviderConnection::set(const CMPIBroker* manager) {
     const std::lock_guard<std::mutex> lock(mutex);
     managersOwn = manager;
-    tables = manager == nullptr ? CMPIBroker{} : *manager;
+    brokersTables = manager == nullptr ? CMPIBroker{} : *manager;
 }
 
 void ProviderConnection::endProvider(const CMPIContext* context) {

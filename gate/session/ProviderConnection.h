@@ -60,22 +60,29 @@ public:
      */
     void requireCurrent(LockGuard& guard, bool mayBeOlder);
 
-    /** @name Whether a class's table has been compared with its file since the provider was loaded */
-    bool isVerified(const Class& owner) const { return (verified & bitOf(owner)) != 0; }
-    void setVerified(const Class& owner) { verified |= bitOf(owner); }
+    /** @name Whether the table of a class with a record file has been compared with its file since it was read */
+    bool isVerified(const Class& owner) { return tableOf(owner)->isVerified; }
+    void setVerified(const Class& owner) { tableOf(owner)->isVerified = true; }
+
+    /** Whether it is known that the provider has read the record file of a class, or the class has none. */
+    bool hasRead(const Class& owner) { return tableOf(owner) == nullptr || tableOf(owner)->isRead; }
 
     /**
-     * Whether the provider has read the record file of a class, or the class has none. The provider does not report
-     * that it could not read. So its records are counted once: fails with CMPI_RC_ERR_FAILED unless they are as many as
-     * the file had when the provider was loaded.
-     * @param count the number of the provider's records; none if they are not counted yet
-     * @return false if they have to be counted
+     * Fails with CMPI_RC_ERR_FAILED unless the provider has as many records of a class as the file had when the
+     * provider was loaded: it does not report that it could not read. Only the first call compares them.
      */
-    bool hasRead(const Class& owner, std::optional<std::size_t> count);
+    void requireRead(const Class& owner, std::size_t count);
     ///@}
 
 private:
-    static std::size_t bitOf(const Class& owner) { return std::size_t{1} << (&owner - Classes().begin()); }
+    /** The provider's table of a record file. */
+    struct Table {
+        const char* name;  ///< of the class
+        bool isRead = false;
+        bool isVerified = false;
+    };
+
+    Table* tableOf(const Class& owner) { return cim::findNamed(tables, owner.name); }
 
     bool load();
     void unload();
@@ -86,8 +93,7 @@ private:
 
     ProviderLibrary library{};
     bool isOutdated = false;
-    std::size_t verified = 0;                                                   ///< a bit of each class
-    std::size_t read = 0;                                                       ///< the same
+    std::array<Table, durable::recordFileCount> tables{Table{"VELKO_Lease"}, Table{"VELKO_Warranty"}};  ///< by file
     std::array<std::optional<std::size_t>, durable::recordFileCount> counts{};  ///< when the provider was loaded
     std::size_t upCalls = 0;  ///< requests in the provider that have released the lock
     std::optional<WrappedBroker> wrapped{};
@@ -95,7 +101,7 @@ private:
     CMPIAssociationMI* associations = nullptr;
     mutable std::mutex mutex{};  ///< of the members below, for callers without the request lock
     const CMPIBroker* managersOwn = nullptr;
-    CMPIBroker tables{};  ///< a copy of the broker, made when the provider was connected
+    CMPIBroker brokersTables{};  ///< a copy of the broker, made when the provider was connected
 };
 
 extern ProviderConnection theConnection;

@@ -5,7 +5,6 @@
 
 #include "ProviderConnection.h"
 #include "gate/cmpi/LocalObject.h"
-#include "gate/cmpi/ResultCollector.h"
 
 namespace gate {
 
@@ -107,11 +106,6 @@ public:
 private:
     void requireRead(const Class& owner) const;
     void requireElementsRead(const Class& association) const;
-
-    template <auto function, class Interface, class... Arguments>
-    ProviderAnswer call(Interface* interface, const LocalObject& path, Arguments... arguments) const;
-    template <auto function, class Interface, class... Arguments>
-    ProviderAnswer read(Interface* interface, const LocalObject& path, Arguments... arguments) const;
 
     LockGuard guard;
     const ClientRequest& request;
