@@ -72,7 +72,7 @@ std::string Transaction::rollBack(const FileState& before) const {
 }
 
 void Transaction::create(const std::string& identifier, const Values& given, const std::function<void()>& returnPath) {
-    requireRoundTrip(file, *cim::findNamed(owner, identifierKey), identifier);
+    requireRoundTrip(file, {{cim::findNamed(owner, identifierKey), identifier}});
     requireRoundTrip(file, given);
     const FileState start = open(identifier.size() + 1 + sizeOf(given));
     requireNew(identifier, start.content);

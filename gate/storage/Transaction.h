@@ -4,7 +4,7 @@
 #include <functional>
 #include <string>
 
-#include "Differences.h"
+#include "StoredValues.h"
 #include "gate/session/ProviderSession.h"
 
 namespace gate {

@@ -1,8 +1,9 @@
-#include "Differences.h"
+#include "StoredValues.h"
 
 #include <algorithm>
 #include <string_view>
 
+#include "KO/Settings.h"
 #include "cim/DateTime.h"
 
 namespace gate {
@@ -74,7 +75,70 @@ bool isCurrent(const Property& property, const CMPIInstance* current, const std:
            (trimmed(*value, false) == given || (mayLackLetters && trimmed(*value, true) == given));
 }
 
+/** The reason why a record file or an object manager loses a string; null if they keep it. */
+const char* lossOfString(std::string_view value, bool isIdentifier) {
+    const auto has = [&](const char* characters) { return value.find_first_of(characters) != std::string_view::npos; };
+    const bool hasOuterBlank = !value.empty() && (value.front() == ' ' || value.back() == ' ');
+    const bool hasAdjacentBlanks = value.find("  ") != std::string_view::npos;
+    return has("_")            ? "an underscore is read back as a blank"
+           : has("\t\n\v\f\r") ? "a tab or line break corrupts the data file's records"
+           : hasOuterBlank     ? "object managers remove blanks at its ends"
+           : hasAdjacentBlanks ? "adjacent blanks may become one on the way to and from clients"
+           : isIdentifier      ? nullptr
+           : value == "*"      ? "\"*\" represents an empty value"
+           : value.size() == 1 ? "a value of one character is lost"
+                               : nullptr;
+}
+
+/** Whether the provider returns a datetime that was stored. It returns null for one that is not valid. */
+bool isRepresentable(const DataFile& file, const std::string& dateTime) {
+    return cim::isPointInTime(dateTime) || (file.hasRecords && cim::isInterval(dateTime));
+}
+
+/** The reason why a value does not survive the round trip; null if it does. */
+const char* lossOf(const DataFile& file, const Property& property, const std::string& value) {
+    if (isDate(property)) {
+        return value == cim::noDate || isRepresentable(file, value) ? nullptr : "it is not a valid datetime";
+    }
+    return property.type == CMPI_string && file.hasRecords ? lossOfString(value, property.isKey) : nullptr;
+}
+
+bool refusesLossyValues() {
+    // Older agents have no such setting, which means true.
+    return &KO::Settings::getFlag == nullptr || KO::Settings::getFlag("gate.refuse_lossy_values", true);
+}
+
+/** Whether the changes remove a value. Two properties may show the same one. */
+bool isRemoved(const std::string& value, const DataFile& file, const CMPIInstance* before, const Values& changes) {
+    return std::any_of(changes.begin(), changes.end(), [&](const auto& change) {
+        const bool isNullDate = isDate(*change.first) && !isRepresentable(file, change.second);
+        return (change.second.empty() || isNullDate) && propertyOf(before, *change.first) == value;
+    });
+}
+
+void requireNothingLost(const Class& owner, const DataFile& file, const CMPIInstance* before, const CMPIInstance* after,
+                        const Values& changes) {
+    for (const Property& property : owner) {
+        const std::string value = propertyOf(before, property).value_or(std::string());
+        const std::string now = propertyOf(after, property).value_or(std::string());
+        const bool isLost = storedValue(property, now).empty() && !storedValue(property, value).empty();
+        if (isLost && !isAmong(property, changes) && !isRemoved(value, file, before, changes)) {
+            fail(CMPI_RC_ERR_FAILED, std::string(property.name) + " was lost: the data file could not be read.");
+        }
+    }
+}
+
 }  // namespace
+
+void requireRoundTrip(const DataFile& file, const Values& values) {
+    for (const auto& [property, value] : values) {
+        const char* loss = property->isKey || property->isWritable ? lossOf(file, *property, value) : nullptr;
+        if (loss != nullptr && refusesLossyValues()) {
+            fail(CMPI_RC_ERR_INVALID_PARAMETER, std::string(file.className) + '.' + property->name + ": the value \"" +
+                                                    value + "\" cannot be stored unchanged: " + loss + ".");
+        }
+    }
+}
 
 Values diff(const CMPIInstance* current, const Values& given, bool areListed) {
     Values changes;
@@ -112,34 +176,10 @@ bool altersFile(const DataFile& file, const CMPIInstance* current, const Values&
     return std::any_of(changes.begin(), changes.end(), [&](const auto& change) {
         const auto& [property, value] = change;
         const std::string before = propertyOf(current, *property).value_or(storedNull(*property));
-        return before != value && survivesRoundTrip(file, *property, before) &&
-               survivesRoundTrip(file, *property, value);
+        return before != value && lossOf(file, *property, before) == nullptr &&
+               lossOf(file, *property, value) == nullptr;
     });
 }
-
-namespace {
-
-/** Whether the changes remove a value. Two properties may show the same one. */
-bool isRemoved(const std::string& value, const DataFile& file, const CMPIInstance* before, const Values& changes) {
-    return std::any_of(changes.begin(), changes.end(), [&](const auto& change) {
-        const bool isNullDate = isDate(*change.first) && !isRepresentable(file, change.second);
-        return (change.second.empty() || isNullDate) && propertyOf(before, *change.first) == value;
-    });
-}
-
-void requireNothingLost(const Class& owner, const DataFile& file, const CMPIInstance* before, const CMPIInstance* after,
-                        const Values& changes) {
-    for (const Property& property : owner) {
-        const std::string value = propertyOf(before, property).value_or(std::string());
-        const std::string now = propertyOf(after, property).value_or(std::string());
-        const bool isLost = storedValue(property, now).empty() && !storedValue(property, value).empty();
-        if (isLost && !isAmong(property, changes) && !isRemoved(value, file, before, changes)) {
-            fail(CMPI_RC_ERR_FAILED, std::string(property.name) + " was lost: the data file could not be read.");
-        }
-    }
-}
-
-}  // namespace
 
 void requireChanged(const Class& owner, const DataFile& file, const CMPIInstance* before, const CMPIInstance* after,
                     const Values& changes) {
