@@ -14,16 +14,14 @@ CMPIData LocalObject::dataOf(Member* member, CMPIValueState state, CMPIrc notFou
     if (member == nullptr) {
         return {CMPI_null, CMPI_notFound | CMPI_nullValue, {}};
     }
-    CMPIData data{member->type, state, {}};
-    if (data.type == CMPI_string) {
-        data.value.string = member->valueString.handle();
-    } else {
-        data.value = scalarFrom(member->characters, data.type);
+    CMPIValue value = scalarFrom(member->characters, member->type);
+    if (member->type == CMPI_string) {
+        value.string = member->valueString.handle();
     }
-    return data;
+    return {member->type, state, value};
 }
 
-CMPIObjectPathFT LocalObject::makePathFunctions() {
+CMPIObjectPathFT LocalObject::pathFunctions = [] {
     CMPIObjectPathFT table{};
     table.ftVersion = CMPIVersion200;
     table.getNameSpace = [](const CMPIObjectPath* self, CMPIStatus* rc) {
@@ -50,19 +48,16 @@ CMPIObjectPathFT LocalObject::makePathFunctions() {
         return static_cast<CMPICount>(of(self).members.size());
     };
     return table;
-}
+}();
 
-CMPIInstanceFT LocalObject::makeInstanceFunctions() {
+CMPIInstanceFT LocalObject::instanceFunctions = [] {
     CMPIInstanceFT table{};
     table.ftVersion = CMPIVersion200;
     table.getProperty = [](const CMPIInstance* self, const char* name, CMPIStatus* rc) {
         return dataOf(cim::findNamed(of(self).members, name), CMPI_goodValue, CMPI_RC_ERR_NO_SUCH_PROPERTY, rc);
     };
     return table;
-}
-
-CMPIObjectPathFT LocalObject::pathFunctions = makePathFunctions();
-CMPIInstanceFT LocalObject::instanceFunctions = makeInstanceFunctions();
+}();
 
 LocalObject localPath(const CMPIObjectPath* path, const Class& named) {
     Values keys;

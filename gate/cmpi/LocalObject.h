@@ -44,8 +44,6 @@ private:
     }
 
     static CMPIData dataOf(Member* member, CMPIValueState state, CMPIrc notFound, CMPIStatus* rc);
-    static CMPIObjectPathFT makePathFunctions();
-    static CMPIInstanceFT makeInstanceFunctions();
     static CMPIObjectPathFT pathFunctions;
     static CMPIInstanceFT instanceFunctions;
 

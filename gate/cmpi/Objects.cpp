@@ -94,48 +94,11 @@ bool isConvertible(const CMPIData& data, CMPIType wanted) {
 }
 
 /** The number that the digits represent; none if it is out of the range of its type. */
-template <class Number>
-std::optional<Number> numberIn(const std::string& digits) {
-    Number number = 0;
+std::optional<CMPIUint32> numberIn(const std::string& digits, CMPIType type) {
+    CMPIUint32 number = 0;
     const auto error = std::from_chars(digits.data(), digits.data() + digits.size(), number).ec;
-    return error == std::errc() ? std::optional<Number>(number) : std::nullopt;
-}
-
-/** Whether an integer is in the range of its type; true for other types. */
-bool fits(const std::string& characters, CMPIType wanted) {
-    return wanted == CMPI_uint32   ? numberIn<CMPIUint32>(characters).has_value()
-           : wanted == CMPI_uint16 ? numberIn<CMPIUint16>(characters).has_value()
-                                   : true;
-}
-
-void add(CMPIObjectPath* path, const char* name, const CMPIValue* value, CMPIType type) {
-    requireOk("add a key", tell<&CMPIObjectPathFT::addKey>(path, name, value, type));
-}
-
-CMPIValue reference(const CMPIObjectPath* target) {
-    CMPIValue value{};
-    value.ref = const_cast<CMPIObjectPath*>(target);
-    return value;
-}
-
-/** Converts the result of a getter for a property; none if the value is absent or null. Fails if the getter failed. */
-std::optional<std::string> convert(const CMPIData& data, const CMPIStatus& status, const Property& property) {
-    if (isAbsent(status)) {
-        return std::nullopt;
-    }
-    requireOk((std::string("return the value of ") + property.name).c_str(), status);
-    if (!cim::hasValue(data)) {
-        return std::nullopt;
-    }
-    if (!isConvertible(data, property.type)) {
-        fail(CMPI_RC_ERR_TYPE_MISMATCH, std::string(property.name) + ": the value has another type than the property.");
-    }
-    auto characters = cim::charactersOf(data);
-    if (characters && !fits(*characters, property.type)) {
-        fail(CMPI_RC_ERR_TYPE_MISMATCH,
-             std::string(property.name) + ": " + *characters + " is out of the range of the property's type.");
-    }
-    return characters;
+    const CMPIUint32 limit = type == CMPI_uint16 ? 0xFFFFU : 0xFFFFFFFFU;
+    return error == std::errc() && number <= limit ? std::optional<CMPIUint32>(number) : std::nullopt;
 }
 
 /** Whether the second path has that key of the first one. */
@@ -155,8 +118,23 @@ bool sameKey(const CMPIData& key, const char* name, const CMPIObjectPath* other)
 }  // namespace
 
 std::optional<std::string> propertyOf(const CMPIInstance* instance, const Property& property) {
-    const auto answer = ask<&CMPIInstanceFT::getProperty>(instance, property.name);
-    return convert(answer.value, answer.status, property);
+    const auto [data, status] = ask<&CMPIInstanceFT::getProperty>(instance, property.name);
+    if (isAbsent(status)) {
+        return std::nullopt;
+    }
+    requireOk((std::string("return the value of ") + property.name).c_str(), status);
+    if (!cim::hasValue(data)) {
+        return std::nullopt;
+    }
+    if (!isConvertible(data, property.type)) {
+        fail(CMPI_RC_ERR_TYPE_MISMATCH, std::string(property.name) + ": the value has another type than the property.");
+    }
+    auto characters = cim::charactersOf(data);
+    if (cim::digitsOf(data) && !numberIn(*characters, property.type)) {
+        fail(CMPI_RC_ERR_TYPE_MISMATCH,
+             std::string(property.name) + ": " + *characters + " is out of the range of the property's type.");
+    }
+    return characters;
 }
 
 std::optional<std::string> keyOf(const CMPIObjectPath* path, const Property& property) {
@@ -173,29 +151,21 @@ CMPIObjectPath* referenceOf(const CMPIObjectPath* path, const char* key) {
 
 CMPIValue scalarFrom(const std::string& characters, CMPIType type) {
     CMPIValue value{};
+    const CMPIUint32 number = numberIn(characters, type).value_or(0);
     if (type == CMPI_boolean) {
         value.boolean = characters == "true" ? 1 : 0;
     } else if (type == CMPI_uint16) {
-        value.uint16 = numberIn<CMPIUint16>(characters).value_or(0);
+        value.uint16 = static_cast<CMPIUint16>(number);
     } else {
-        value.uint32 = numberIn<CMPIUint32>(characters).value_or(0);
+        value.uint32 = number;
     }
     return value;
 }
 
-void setReference(const CMPIInstance* instance, const char* name, const CMPIObjectPath* target) {
-    const CMPIValue value = reference(target);
-    requireOk("set a property", tell<&CMPIInstanceFT::setProperty>(instance, name, &value, CMPIType{CMPI_ref}));
-}
-
-void addKey(CMPIObjectPath* path, const char* name, const std::string& characters) {
-    // In CMPI, the pointer to a value of type CMPI_chars is the pointer to its characters.
-    add(path, name, reinterpret_cast<const CMPIValue*>(characters.c_str()), CMPI_chars);
-}
-
-void addReference(CMPIObjectPath* path, const char* name, const CMPIObjectPath* target) {
-    const CMPIValue value = reference(target);
-    add(path, name, &value, CMPI_ref);
+CMPIValue referenceTo(const CMPIObjectPath* target) {
+    CMPIValue value{};
+    value.ref = const_cast<CMPIObjectPath*>(target);
+    return value;
 }
 
 bool samePath(const CMPIObjectPath* left, const CMPIObjectPath* right) {

@@ -91,12 +91,17 @@ CMPIObjectPath* referenceOf(const CMPIObjectPath* path, const char* key);
 /** An integer or boolean as a CMPI value. */
 CMPIValue scalarFrom(const std::string& characters, CMPIType type);
 
-/** @name Setters, which fail if the object manager does */
-///@{
-void setReference(const CMPIInstance* instance, const char* name, const CMPIObjectPath* target);
-void addKey(CMPIObjectPath* path, const char* name, const std::string& characters);
-void addReference(CMPIObjectPath* path, const char* name, const CMPIObjectPath* target);
-///@}
+CMPIValue referenceTo(const CMPIObjectPath* target);
+
+/** Sets a property of an instance. Fails if the object manager does. */
+inline void setProperty(const CMPIInstance* instance, const char* name, const CMPIValue* value, CMPIType type) {
+    requireOk("set a property", tell<&CMPIInstanceFT::setProperty>(instance, name, value, type));
+}
+
+/** Adds a key to a path. Fails if the object manager does. */
+inline void addKey(CMPIObjectPath* path, const char* name, const CMPIValue* value, CMPIType type) {
+    requireOk("add a key", tell<&CMPIObjectPathFT::addKey>(path, name, value, type));
+}
 
 /** Whether two paths have keys and name the same instance. Namespaces are compared where both paths have one. */
 bool samePath(const CMPIObjectPath* left, const CMPIObjectPath* right);

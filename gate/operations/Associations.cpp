@@ -9,19 +9,19 @@ namespace gate {
 
 namespace {
 
-/** A computer that the object manager knows. */
-struct Computer {
+/** An object at an end of an association. */
+struct End {
     const CMPIObjectPath* path;
     const CMPIInstance* instance;
 };
 
-using Computers = std::vector<Computer>;
+/** The computers that the object manager knows. */
+using Computers = std::vector<End>;
 
-/** The two ends of an association: a computer and one of its leases or warranties, as a path or as an instance. */
+/** A computer and one of its leases or warranties, which is either a path or an instance. */
 struct AssociationPair {
-    Computer computer;
-    const CMPIObjectPath* element;
-    const CMPIInstance* elementInstance;
+    End computer;
+    End element;
 };
 
 enum class ElementForm { path, instance };
@@ -88,8 +88,8 @@ Computers knownComputers(const ClientRequest& request, ProviderSession& session)
             // Makes the instance's path complete, too, if the manager can.
             tell<&CMPIInstanceFT::setObjectPath>(instance, path);
         }
-        const bool isKnown = std::any_of(computers.begin(), computers.end(),
-                                         [&](const Computer& each) { return samePath(each.path, path); });
+        const bool isKnown =
+            std::any_of(computers.begin(), computers.end(), [&](const End& each) { return samePath(each.path, path); });
         if (!isKnown) {
             computers.push_back({path, instance});
         }
@@ -99,7 +99,7 @@ Computers knownComputers(const ClientRequest& request, ProviderSession& session)
 
 /** The computer with the path, or none. */
 Computers computerAt(const CMPIObjectPath* path, Computers computers) {
-    const auto isOther = [&](const Computer& each) { return !samePath(each.path, path); };
+    const auto isOther = [&](const End& each) { return !samePath(each.path, path); };
     computers.erase(std::remove_if(computers.begin(), computers.end(), isOther), computers.end());
     return computers;
 }
@@ -108,15 +108,15 @@ Computers computerAt(const CMPIObjectPath* path, Computers computers) {
 Pairs pairsOf(const ProviderSession& session, const Computers& computers, const Class& association,
               ElementForm form = ElementForm::path) {
     Pairs pairs;
-    for (const Computer& computer : computers) {
+    for (const End& computer : computers) {
         const LocalObject keys = localPath(computer.path, *findClass(computerClass));
         if (form == ElementForm::instance) {
             for (const CMPIInstance* instance : session.associators(keys, association)) {
-                pairs.push_back({computer, nullptr, instance});
+                pairs.push_back({computer, {nullptr, instance}});
             }
         } else {
             for (const CMPIObjectPath* path : session.associatorNames(keys, association)) {
-                pairs.push_back({computer, path, nullptr});
+                pairs.push_back({computer, {path, nullptr}});
             }
         }
     }
@@ -140,20 +140,15 @@ bool isA(const ClientRequest& request, const CMPIObjectPath* path, const char* c
     }
     // No class of the MOF is a subclass of another.
     const bool areBothKnown = findClass(pathsClass) != nullptr && findClass(className) != nullptr;
-    if (areBothKnown || broker->eft == nullptr || broker->eft->classPathIsA == nullptr) {
-        return false;
-    }
-    CMPIStatus status{CMPI_RC_OK, nullptr};
-    const bool answer = broker->eft->classPathIsA(broker, path, className, &status) != 0;
-    return answer && status.rc == CMPI_RC_OK;
+    return !areBothKnown && make<&CMPIBrokerEncFT::classPathIsA>(broker, path, className) != 0;
 }
 
 bool isComputerEnd(const Property& end) {
     return sameName(end.referenceClass, computerClass);
 }
 
-const CMPIObjectPath* pathAt(const Property& end, const AssociationPair& pair) {
-    return isComputerEnd(end) ? pair.computer.path : pair.element;
+const End& at(const Property& end, const AssociationPair& pair) {
+    return isComputerEnd(end) ? pair.computer : pair.element;
 }
 
 /** A direction of an association. */
@@ -214,7 +209,7 @@ Answers traverse(const ClientRequest& request, const TraversalFilter& filter, El
                                 ? pairsOf(session, computerAt(request.path, computers), *traversal.association, form)
                                 : pairsOf(session, computers, *traversal.association);
         for (const AssociationPair& pair : pairs) {
-            if (isFromComputer || samePath(pair.element, request.path)) {
+            if (isFromComputer || samePath(pair.element.path, request.path)) {
                 answers.push_back(visit(traversal, pair));
             }
         }
@@ -236,7 +231,8 @@ const CMPIObjectPath* associationPath(const ClientRequest& request, const Class&
                                       const AssociationPair& pair) {
     CMPIObjectPath* path = makePath(request.broker(), nameSpaceOf(request.path), association.name);
     for (const Property& end : association) {
-        addReference(path, end.name, pathAt(end, pair));
+        const CMPIValue target = referenceTo(at(end, pair).path);
+        addKey(path, end.name, &target, CMPI_ref);
     }
     return path;
 }
@@ -246,7 +242,8 @@ const CMPIInstance* associationInstance(const ClientRequest& request, const Clas
                                         const AssociationPair& pair) {
     CMPIInstance* instance = makeInstance(request.broker(), associationPath(request, association, pair));
     for (const Property& end : association) {
-        setReference(instance, end.name, pathAt(end, pair));
+        const CMPIValue target = referenceTo(at(end, pair).path);
+        setProperty(instance, end.name, &target, CMPI_ref);
     }
     return instance;
 }
@@ -277,8 +274,7 @@ void associators(const ClientRequest& request, const char* associationClass, con
                  const char* resultRole, const char** properties) {
     const auto instanceAt = [&](const Traversal& traversal, const AssociationPair& pair) {
         const PropertySelection selection(properties, *findClass(traversal.target->referenceClass));
-        return selection.applied(request.broker(),
-                                 isComputerEnd(*traversal.target) ? pair.computer.instance : pair.elementInstance);
+        return selection.applied(request.broker(), at(*traversal.target, pair).instance);
     };
     giveOfClass(request, resultClass,
                 traverse<Instances>(request, {associationClass, role, resultRole}, ElementForm::instance, instanceAt),
@@ -288,7 +284,7 @@ void associators(const ClientRequest& request, const char* associationClass, con
 void associatorNames(const ClientRequest& request, const char* associationClass, const char* resultClass,
                      const char* role, const char* resultRole) {
     const auto targetOf = [](const Traversal& traversal, const AssociationPair& pair) {
-        return pathAt(*traversal.target, pair);
+        return at(*traversal.target, pair).path;
     };
     giveOfClass(request, resultClass,
                 traverse<Paths>(request, {associationClass, role, resultRole}, ElementForm::path, targetOf),

@@ -65,7 +65,8 @@ void createInstance(const ClientRequest& request, const CMPIInstance* instance) 
     const Values given = valuesOf(instance, requested, [](const Property& property) { return !property.isKey; });
     const std::string nameSpace = nameSpaceOf(request.path);
     CMPIObjectPath* created = makePath(session.broker(), nameSpace, requested.name);
-    addKey(created, key.name, identifier);
+    // In CMPI, the pointer to a value of type CMPI_chars is the pointer to its characters.
+    addKey(created, key.name, reinterpret_cast<const CMPIValue*>(identifier.c_str()), CMPI_chars);
     const Paths answer{created};
     const LocalObject path(nameSpace, requested, {{&key, identifier}});
     Transaction(session, requested, file, path).create(identifier, given, [&] { request.give(answer); });

@@ -47,8 +47,7 @@ const CMPIInstance* PropertySelection::applied(const CMPIBroker* broker, const C
         const bool isPresent = answer.isOk() && (answer.value.state & (CMPI_notFound | CMPI_badValue)) == 0;
         if (isPresent && (property.isKey || has(property))) {
             const CMPIValue* value = cim::hasValue(answer.value) ? &answer.value.value : nullptr;
-            requireOk("set a property",
-                      tell<&CMPIInstanceFT::setProperty>(made, property.name, value, answer.value.type));
+            setProperty(made, property.name, value, answer.value.type);
         }
     }
     return made;
