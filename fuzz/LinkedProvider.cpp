@@ -1,5 +1,5 @@
 #include "SystemUnderTest.h"
-#include "gate/session/ProviderLibrary.h"
+#include "gate/session/ProviderConnection.h"
 
 // The gate as the system under test. Its provider is linked into the fuzzer, too: loading it only destroys and reads
 // its tables.

@@ -5,7 +5,6 @@
 #include <mutex>
 #include <optional>
 
-#include "ProviderLibrary.h"
 #include "RequestLock.h"
 #include "durable/RecordFile.h"
 #include "gate/cmpi/Schema.h"
@@ -13,12 +12,37 @@
 
 namespace gate {
 
+/**
+ * The provider's shared library, in the directory of this one. It is not linked: the provider reads its record files
+ * when it is loaded, so they must be recovered first. If it is loaded again, it reads them again.
+ */
+class ProviderLibrary {
+public:
+    bool isLoaded() const { return handle != nullptr; }
+
+    /**
+     * Loads the library. Throws std::runtime_error with the reason, also if another part of the process has loaded it:
+     * the provider would not read its files again.
+     */
+    void load();
+
+    /** Unloads the library if it is loaded. */
+    void unload();
+
+    /** @name The factories, while it is loaded. Null if the provider returns no interface. */
+    ///@{
+    CMPIInstanceMI* createInstanceMI(const CMPIBroker* broker) const;
+    CMPIAssociationMI* createAssociationMI(const CMPIBroker* broker) const;
+    ///@}
+
+private:
+    void* handle = nullptr;
+};
+
 /** The process's only connection between the provider and an object manager. Loads and unloads the provider. */
 class ProviderConnection {
 public:
     constexpr ProviderConnection() = default;
-    ProviderConnection(const ProviderConnection&) = delete;
-    ProviderConnection& operator=(const ProviderConnection&) = delete;
 
     /**
      * Connects the provider to a broker, which then serves all requests. Opens the request lock if it was

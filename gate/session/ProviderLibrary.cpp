@@ -1,9 +1,9 @@
-#include "ProviderLibrary.h"
-
 #include <dlfcn.h>
 
 #include <stdexcept>
 #include <string>
+
+#include "ProviderConnection.h"
 
 namespace gate {
 
