@@ -83,7 +83,7 @@ void modifyInstance(const ClientRequest& request, const CMPIInstance* instance, 
     requireKnownProperties(requested, instance);
     const Values given = valuesOf(instance, requested, [&](const Property& each) { return selection.has(each); });
     const CMPIInstance* current = session.get(path, requested);
-    const Values changes = diff(current, given, selection.isListed());
+    const Values changes = diff(current, given, properties != nullptr);
     if (!changes.empty()) {
         Transaction(session, requested, file, path).modify(current, changes);
     }

@@ -18,9 +18,6 @@ public:
     /** @param list names, ended by a null pointer; null for none */
     PropertySelection(const char** list, const Class& itsClass);
 
-    /** Whether there is a list, so that the client has chosen the properties on it. */
-    bool isListed() const { return hasList; }
-
     bool has(const Property& property) const;
 
     /** Fails with CMPI_RC_ERR_NO_SUCH_PROPERTY if a name on the list is not a property of the class. */

@@ -134,7 +134,7 @@ void requireRoundTrip(const DataFile& file, const Values& values) {
     for (const auto& [property, value] : values) {
         const char* loss = property->isKey || property->isWritable ? lossOf(file, *property, value) : nullptr;
         if (loss != nullptr && refusesLossyValues()) {
-            fail(CMPI_RC_ERR_INVALID_PARAMETER, std::string(file.className) + '.' + property->name + ": the value \"" +
+            fail(CMPI_RC_ERR_INVALID_PARAMETER, std::string(file.name) + '.' + property->name + ": the value \"" +
                                                     value + "\" cannot be stored unchanged: " + loss + ".");
         }
     }

@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <exception>
 #include <iterator>
+#include <system_error>
 
 namespace gate {
 
@@ -19,6 +20,22 @@ std::size_t sizeOf(const Values& values) {
     return size;
 }
 
+/** Calls a function, and reports the errors of files to the client. */
+template <class Work>
+auto onFiles(Work work) {
+    try {
+        return work();
+    } catch (const std::system_error& error) {
+        fail(CMPI_RC_ERR_FAILED, std::string("The change cannot be stored in ") + error.what() + ".");
+    }
+}
+
+/** Whether a record file needs no recovery and has this number of records. */
+bool hasCount(const durable::RecordFile& file, std::size_t count) {
+    const auto promised = durable::RecordFile::promisedIn(file.content().value_or(std::string()));
+    return !file.needsRecovery() && promised.value_or(0) == count;
+}
+
 }  // namespace
 
 Transaction::Transaction(ProviderSession& itsSession, const Class& itsClass, const DataFile& itsFile,
@@ -27,9 +44,11 @@ Transaction::Transaction(ProviderSession& itsSession, const Class& itsClass, con
 
 /** Returns the state of the file before a change. Fails if the change cannot be written or would lose records. */
 FileState Transaction::open(std::size_t growth) const {
-    file.requireWritable(growth);
-    requireTable();
-    return file.state();
+    return onFiles([&] {
+        file.requireWritable(growth);
+        requireTable();
+        return file.state();
+    });
 }
 
 /**
@@ -38,9 +57,9 @@ FileState Transaction::open(std::size_t growth) const {
  */
 template <class Change>
 void Transaction::run(FileState before, Change change) const {
-    file.begin(before);
+    onFiles([&] { file.begin(before); });
     try {
-        change(before);
+        onFiles([&] { change(before); });
     } catch (Failure& failure) {
         failure.message += rollBack(before);
         throw;
@@ -62,7 +81,7 @@ std::string Transaction::rollBack(const FileState& before) const {
         if (file.hasRecords && !before.restorable.empty()) {
             session.setOutdated();
         }
-        file.rollBack(before);
+        onFiles([&] { file.rollBack(before); });
         return {};
     } catch (const Failure& failure) {
         return " The change could not be rolled back. " + failure.message;
@@ -115,14 +134,14 @@ void Transaction::apply(const CMPIInstance* current, const Values& changes) cons
  * report that it could not read the file.
  */
 void Transaction::requireTable() const {
-    if (!file.hasRecords || (theConnection.isVerified(owner) && file.isStored())) {
+    if (!file.hasRecords || (theConnection.isVerified(owner) && file.records().isStored())) {
         return;
     }
     const Paths paths = session.names(owner);
-    if (!paths.empty() && !file.isStored()) {
+    if (!paths.empty() && !file.records().isStored()) {
         storeTable(paths.front());
     }
-    if (!file.hasCount(paths.size())) {
+    if (!hasCount(file.records(), paths.size())) {
         session.setOutdated();
         fail(CMPI_RC_ERR_FAILED, std::string(file.fileName) +
                                      " has other records than the provider. It is read again; repeat the request.");
