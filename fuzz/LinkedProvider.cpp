@@ -28,14 +28,10 @@ void ProviderLibrary::unload() {
     handle = nullptr;
 }
 
-CMPIInstanceMI* ProviderLibrary::createInstanceMI(const CMPIBroker* broker) const {
+ProviderInterfaces ProviderLibrary::createInterfaces(const CMPIBroker* broker) const {
     CMPIStatus status{CMPI_RC_OK, nullptr};
-    return LeaseAndWarrantyProvider_Create_InstanceMI(broker, nullptr, &status);
-}
-
-CMPIAssociationMI* ProviderLibrary::createAssociationMI(const CMPIBroker* broker) const {
-    CMPIStatus status{CMPI_RC_OK, nullptr};
-    return LeaseAndWarrantyProvider_Create_AssociationMI(broker, nullptr, &status);
+    return {LeaseAndWarrantyProvider_Create_InstanceMI(broker, nullptr, &status),
+            LeaseAndWarrantyProvider_Create_AssociationMI(broker, nullptr, &status)};
 }
 
 }  // namespace gate

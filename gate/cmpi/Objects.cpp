@@ -22,14 +22,6 @@ void logError(const std::string& message, const char* function, const char* file
     }
 }
 
-std::string toString(const CMPIString* string) {
-    return cim::charactersOf(string).value_or(std::string());
-}
-
-bool isAbsent(const CMPIStatus& status) {
-    return status.rc == CMPI_RC_ERR_NOT_FOUND || status.rc == CMPI_RC_ERR_NO_SUCH_PROPERTY;
-}
-
 std::string managerFailure(const char* task, const CMPIStatus& status) {
     std::string message = std::string("The object manager could not ") + task;
     if (status.rc != CMPI_RC_OK) {
@@ -81,16 +73,10 @@ namespace {
 /** Whether a value is accepted for a property of a type: managers do not keep types apart strictly. */
 bool isConvertible(const CMPIData& data, CMPIType wanted) {
     const bool isString = data.type == CMPI_string || data.type == CMPI_chars;
-    switch (wanted) {
-        case CMPI_string:
-            return isString;
-        case CMPI_dateTime:
-            return isString || data.type == CMPI_dateTime;
-        case CMPI_boolean:
-            return data.type == CMPI_boolean;
-        default:
-            return cim::digitsOf(data).has_value();
-    }
+    return wanted == CMPI_string     ? isString
+           : wanted == CMPI_dateTime ? isString || data.type == CMPI_dateTime
+           : wanted == CMPI_boolean  ? data.type == CMPI_boolean
+                                     : cim::digitsOf(data).has_value();
 }
 
 /** The number that the digits represent; none if it is out of the range of its type. */

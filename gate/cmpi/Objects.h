@@ -20,10 +20,14 @@ using cim::make;
 using cim::tell;
 
 /** The characters of a string; empty if any part of it is missing. */
-std::string toString(const CMPIString* string);
+inline std::string toString(const CMPIString* string) {
+    return cim::charactersOf(string).value_or(std::string());
+}
 
 /** Whether a status says that a key or property does not exist. */
-bool isAbsent(const CMPIStatus& status);
+inline bool isAbsent(const CMPIStatus& status) {
+    return status.rc == CMPI_RC_ERR_NOT_FOUND || status.rc == CMPI_RC_ERR_NO_SUCH_PROPERTY;
+}
 
 /** The message that the object manager could not do a task, with its status and its reason if it returned one. */
 std::string managerFailure(const char* task, const CMPIStatus& status);

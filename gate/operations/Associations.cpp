@@ -18,8 +18,16 @@ struct End {
 /** The computers that the object manager knows. */
 using Computers = std::vector<End>;
 
+/** A direction of an association. Without source and target, both. */
+struct Traversal {
+    const Class* association;
+    const Property* source = nullptr;
+    const Property* target = nullptr;
+};
+
 /** A computer and one of its leases or warranties, which is either a path or an instance. */
 struct AssociationPair {
+    Traversal traversal;
     End computer;
     End element;
 };
@@ -105,18 +113,18 @@ Computers computerAt(const CMPIObjectPath* path, Computers computers) {
 }
 
 /** The pairs of an association, in the order of the computers. The provider knows the elements of each. */
-Pairs pairsOf(const ProviderSession& session, const Computers& computers, const Class& association,
+Pairs pairsOf(const ProviderSession& session, const Computers& computers, const Traversal& traversal,
               ElementForm form = ElementForm::path) {
     Pairs pairs;
     for (const End& computer : computers) {
         const LocalObject keys = localPath(computer.path, *findClass(computerClass));
         if (form == ElementForm::instance) {
-            for (const CMPIInstance* instance : session.associators(keys, association)) {
-                pairs.push_back({computer, {nullptr, instance}});
+            for (const CMPIInstance* instance : session.associators(keys, *traversal.association)) {
+                pairs.push_back({traversal, computer, {nullptr, instance}});
             }
         } else {
-            for (const CMPIObjectPath* path : session.associatorNames(keys, association)) {
-                pairs.push_back({computer, {path, nullptr}});
+            for (const CMPIObjectPath* path : session.associatorNames(keys, *traversal.association)) {
+                pairs.push_back({traversal, computer, {path, nullptr}});
             }
         }
     }
@@ -151,13 +159,6 @@ const End& at(const Property& end, const AssociationPair& pair) {
     return isComputerEnd(end) ? pair.computer : pair.element;
 }
 
-/** A direction of an association. */
-struct Traversal {
-    const Class* association;
-    const Property* source;
-    const Property* target;
-};
-
 /**
  * A client's restriction. Names ignore letter case; null and the empty string mean any. The role is the property of the
  * association that refers to the source, the result role the one that refers to the target.
@@ -188,11 +189,11 @@ std::vector<Traversal> traversalsFrom(const ClientRequest& request, const Traver
 }
 
 /**
- * Returns what `visit(traversal, pair)` returns for each pair at the request's path, in one session.
+ * Returns what `make(request, pair)` makes of each pair at the request's path, in one session.
  * @param form of the elements at the targets of the traversals
  */
-template <class Answers, class Visit>
-Answers traverse(const ClientRequest& request, const TraversalFilter& filter, ElementForm form, Visit visit) {
+template <class Answers, class Make>
+Answers traverse(const ClientRequest& request, const TraversalFilter& filter, ElementForm form, Make make) {
     if (keyCountOf(request.path) == 0) {
         fail(CMPI_RC_ERR_INVALID_PARAMETER, "Associations begin at an instance: the path needs its keys.");
     }
@@ -205,12 +206,11 @@ Answers traverse(const ClientRequest& request, const TraversalFilter& filter, El
     const Computers computers = knownComputers(request, session);
     for (const Traversal& traversal : traversals) {
         const bool isFromComputer = isComputerEnd(*traversal.source);
-        const Pairs pairs = isFromComputer
-                                ? pairsOf(session, computerAt(request.path, computers), *traversal.association, form)
-                                : pairsOf(session, computers, *traversal.association);
+        const Pairs pairs = isFromComputer ? pairsOf(session, computerAt(request.path, computers), traversal, form)
+                                           : pairsOf(session, computers, traversal);
         for (const AssociationPair& pair : pairs) {
             if (isFromComputer || samePath(pair.element.path, request.path)) {
-                answers.push_back(visit(traversal, pair));
+                answers.push_back(make(request, pair));
             }
         }
     }
@@ -227,8 +227,8 @@ void giveOfClass(const ClientRequest& request, const char* resultClass, Answers 
     request.give(answers);
 }
 
-const CMPIObjectPath* associationPath(const ClientRequest& request, const Class& association,
-                                      const AssociationPair& pair) {
+const CMPIObjectPath* associationPath(const ClientRequest& request, const AssociationPair& pair) {
+    const Class& association = *pair.traversal.association;
     CMPIObjectPath* path = makePath(request.broker(), nameSpaceOf(request.path), association.name);
     for (const Property& end : association) {
         const CMPIValue target = referenceTo(at(end, pair).path);
@@ -238,10 +238,9 @@ const CMPIObjectPath* associationPath(const ClientRequest& request, const Class&
 }
 
 /** The instance of an association. Both of its properties are keys, so a property list does not restrict it. */
-const CMPIInstance* associationInstance(const ClientRequest& request, const Class& association,
-                                        const AssociationPair& pair) {
-    CMPIInstance* instance = makeInstance(request.broker(), associationPath(request, association, pair));
-    for (const Property& end : association) {
+const CMPIInstance* associationInstance(const ClientRequest& request, const AssociationPair& pair) {
+    CMPIInstance* instance = makeInstance(request.broker(), associationPath(request, pair));
+    for (const Property& end : *pair.traversal.association) {
         const CMPIValue target = referenceTo(at(end, pair).path);
         setProperty(instance, end.name, &target, CMPI_ref);
     }
@@ -253,28 +252,20 @@ template <class Answers, class Make>
 Answers allOf(const ClientRequest& request, const Class& association, Make make) {
     ProviderSession session(request);
     Answers answers;
-    for (const AssociationPair& pair : pairsOf(session, knownComputers(request, session), association)) {
-        answers.push_back(make(request, association, pair));
+    for (const AssociationPair& pair : pairsOf(session, knownComputers(request, session), {&association})) {
+        answers.push_back(make(request, pair));
     }
     return answers;
-}
-
-/** Returns what `make` makes of the pairs of all associations at the request's path. */
-template <class Answers, class Make>
-Answers referencesFrom(const ClientRequest& request, const char* associationClass, const char* role, Make make) {
-    return traverse<Answers>(request, {associationClass, role, nullptr}, ElementForm::path,
-                             [&](const Traversal& traversal, const AssociationPair& pair) {
-                                 return make(request, *traversal.association, pair);
-                             });
 }
 
 }  // namespace
 
 void associators(const ClientRequest& request, const char* associationClass, const char* resultClass, const char* role,
                  const char* resultRole, const char** properties) {
-    const auto instanceAt = [&](const Traversal& traversal, const AssociationPair& pair) {
-        const PropertySelection selection(properties, *findClass(traversal.target->referenceClass));
-        return selection.applied(request.broker(), at(*traversal.target, pair).instance);
+    const auto instanceAt = [&](const ClientRequest&, const AssociationPair& pair) {
+        const Property& target = *pair.traversal.target;
+        const PropertySelection selection(properties, *findClass(target.referenceClass));
+        return selection.applied(request.broker(), at(target, pair).instance);
     };
     giveOfClass(request, resultClass,
                 traverse<Instances>(request, {associationClass, role, resultRole}, ElementForm::instance, instanceAt),
@@ -283,8 +274,8 @@ void associators(const ClientRequest& request, const char* associationClass, con
 
 void associatorNames(const ClientRequest& request, const char* associationClass, const char* resultClass,
                      const char* role, const char* resultRole) {
-    const auto targetOf = [](const Traversal& traversal, const AssociationPair& pair) {
-        return at(*traversal.target, pair).path;
+    const auto targetOf = [](const ClientRequest&, const AssociationPair& pair) {
+        return at(*pair.traversal.target, pair).path;
     };
     giveOfClass(request, resultClass,
                 traverse<Paths>(request, {associationClass, role, resultRole}, ElementForm::path, targetOf),
@@ -292,11 +283,12 @@ void associatorNames(const ClientRequest& request, const char* associationClass,
 }
 
 void references(const ClientRequest& request, const char* associationClass, const char* role, const char**) {
-    request.give(referencesFrom<Instances>(request, associationClass, role, associationInstance));
+    request.give(
+        traverse<Instances>(request, {associationClass, role, nullptr}, ElementForm::path, associationInstance));
 }
 
 void referenceNames(const ClientRequest& request, const char* associationClass, const char* role) {
-    request.give(referencesFrom<Paths>(request, associationClass, role, associationPath));
+    request.give(traverse<Paths>(request, {associationClass, role, nullptr}, ElementForm::path, associationPath));
 }
 
 Instances associationInstances(const ClientRequest& request, const Class& association) {
@@ -318,10 +310,10 @@ const CMPIInstance* associationAt(const ClientRequest& request, const Class& ass
         }
         computer = isComputerEnd(end) ? target : computer;
     }
-    for (const AssociationPair& pair :
-         pairsOf(session, computerAt(computer, knownComputers(request, session)), association)) {
-        if (samePath(associationPath(request, association, pair), request.path)) {
-            return associationInstance(request, association, pair);
+    const Computers computers = computerAt(computer, knownComputers(request, session));
+    for (const AssociationPair& pair : pairsOf(session, computers, {&association})) {
+        if (samePath(associationPath(request, pair), request.path)) {
+            return associationInstance(request, pair);
         }
     }
     fail(CMPI_RC_ERR_NOT_FOUND, std::string("There is no such ") + association.name + ".");

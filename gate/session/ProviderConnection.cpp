@@ -44,16 +44,6 @@ void stayLoaded() {
     }
 }
 
-/** The agent's data directory. */
-durable::DataDirectory theDirectory{[] { return std::string(KO::PlatformUtilities::getKelsaDataDir()); },
-                                    [](const std::string& message) { logError(message); }};
-
-}  // namespace
-
-ProviderConnection theConnection;
-
-namespace {
-
 /** Shuts down when this library is unloaded and when the process ends. */
 class ShutdownAtExit {
 public:
@@ -78,9 +68,15 @@ private:
     bool isRegistering = false;
 };
 
-ShutdownAtExit shutdownAtExit;  // destroyed before the objects above
+/** The agent's data directory. */
+durable::DataDirectory theDirectory{[] { return std::string(KO::PlatformUtilities::getKelsaDataDir()); },
+                                    [](const std::string& message) { logError(message); }};
 
 }  // namespace
+
+ProviderConnection theConnection;
+
+static ShutdownAtExit shutdownAtExit;  // destroyed before the objects above
 
 void ProviderConnection::connect(const CMPIBroker* manager) {
     const bool isOpen = theRequestLock.open();
@@ -132,17 +128,14 @@ void ProviderConnection::requireCurrent(LockGuard& guard, bool mayBeOlder) {
         return isWaiting = needsLoading && (upCalls != 0 || !load());
     };
     waitWhile(guard, newerTimeout, update);
-    if (isWaiting && mayBeOlder && library.isLoaded() && !isOutdated) {
-        return;
-    }
-    if (isWaiting) {
+    const bool mayUseOlder = mayBeOlder && library.isLoaded() && !isOutdated;
+    if (isWaiting && !mayUseOlder) {
         waitWhile(guard, waitTimeout, update);
     }
-    if (isWaiting && upCalls != 0) {
-        fail(CMPI_RC_ERR_FAILED, "The provider waits for the object manager and cannot be loaded again. Try again.");
-    }
-    if (isWaiting) {
-        fail(CMPI_RC_ERR_FAILED, "The record files are incomplete, or another process is writing them. Try again.");
+    if (isWaiting && !mayUseOlder) {
+        fail(CMPI_RC_ERR_FAILED,
+             upCalls != 0 ? "The provider waits for the object manager and cannot be loaded again. Try again."
+                          : "The record files are incomplete, or another process is writing them. Try again.");
     }
 }
 
@@ -190,15 +183,13 @@ void ProviderConnection::requireRead(const Class& owner, std::size_t count) {
 }
 
 void ProviderConnection::unload() {
-    instances = nullptr;
-    associations = nullptr;
+    providers = {};
     library.unload();
 }
 
 void ProviderConnection::createInterfaces() {
-    instances = library.createInstanceMI(wrapped->handle());
-    associations = library.createAssociationMI(wrapped->handle());
-    if (instances == nullptr || associations == nullptr) {
+    providers = library.createInterfaces(wrapped->handle());
+    if (providers.instances == nullptr || providers.associations == nullptr) {
         fail(CMPI_RC_ERR_FAILED, "The provider did not return its interfaces.");
     }
 }
@@ -238,6 +229,7 @@ void ProviderConnection::set(const CMPIBroker* manager) {
 }
 
 void ProviderConnection::endProvider(const CMPIContext* context) {
+    const auto [instances, associations] = providers;
     if (broker() != nullptr && instances != nullptr && associations != nullptr) {
         instances->ft->cleanup(instances, context, 1);
         associations->ft->cleanup(associations, context, 1);

@@ -12,6 +12,12 @@
 
 namespace gate {
 
+/** The provider's interfaces. Null if it has returned none. */
+struct ProviderInterfaces {
+    CMPIInstanceMI* instances = nullptr;
+    CMPIAssociationMI* associations = nullptr;
+};
+
 /**
  * The provider's shared library, in the directory of this one. It is not linked: the provider reads its record files
  * when it is loaded, so they must be recovered first. If it is loaded again, it reads them again.
@@ -29,11 +35,8 @@ public:
     /** Unloads the library if it is loaded. */
     void unload();
 
-    /** @name The factories, while it is loaded. Null if the provider returns no interface. */
-    ///@{
-    CMPIInstanceMI* createInstanceMI(const CMPIBroker* broker) const;
-    CMPIAssociationMI* createAssociationMI(const CMPIBroker* broker) const;
-    ///@}
+    /** Calls the factories, while it is loaded. */
+    ProviderInterfaces createInterfaces(const CMPIBroker* broker) const;
 
 private:
     void* handle = nullptr;
@@ -64,8 +67,7 @@ public:
     /** @name Callable with the request lock held, while there is a broker */
     ///@{
     WrappedBroker& wrappedBroker() { return *wrapped; }
-    CMPIInstanceMI* instanceInterface() const { return instances; }
-    CMPIAssociationMI* associationInterface() const { return associations; }
+    const ProviderInterfaces& interfaces() const { return providers; }
 
     /**
      * Ensures that this process owns the data directory, for a change. Releases the lock until another owner ends.
@@ -121,8 +123,7 @@ private:
     std::array<std::optional<std::size_t>, durable::recordFileCount> counts{};  ///< when the provider was loaded
     std::size_t upCalls = 0;  ///< requests in the provider that have released the lock
     std::optional<WrappedBroker> wrapped{};
-    CMPIInstanceMI* instances = nullptr;
-    CMPIAssociationMI* associations = nullptr;
+    ProviderInterfaces providers{};
     mutable std::mutex mutex{};  ///< of the members below, for callers without the request lock
     const CMPIBroker* managersOwn = nullptr;
     CMPIBroker brokersTables{};  ///< a copy of the broker, made when the provider was connected

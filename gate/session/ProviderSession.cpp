@@ -74,12 +74,12 @@ CMPIResultFT collectorFunctions{
 
 template <class Function>
 CMPIInstanceMI* interfaceOf(Function CMPIInstanceMIFT::*) {
-    return theConnection.instanceInterface();
+    return theConnection.interfaces().instances;
 }
 
 template <class Function>
 CMPIAssociationMI* interfaceOf(Function CMPIAssociationMIFT::*) {
-    return theConnection.associationInterface();
+    return theConnection.interfaces().associations;
 }
 
 /** Calls a function of one of the provider's interfaces. */
