@@ -63,10 +63,8 @@ LocalObject localPath(const CMPIObjectPath* path, const Class& named) {
     Values keys;
     for (const Property& property : named) {
         auto value = property.isKey ? keyOf(path, property) : std::nullopt;
-        if (property.isKey && !value) {
-            fail(CMPI_RC_ERR_INVALID_PARAMETER,
-                 std::string("The path of a ") + named.name + " needs the key " + property.name + " as a string.");
-        }
+        failIf(property.isKey && !value, CMPI_RC_ERR_INVALID_PARAMETER, "The path of a ", named.name, " needs the key ",
+               property.name, " as a string.");
         if (value) {
             keys.emplace_back(&property, std::move(*value));
         }

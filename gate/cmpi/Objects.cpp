@@ -112,13 +112,12 @@ std::optional<std::string> propertyOf(const CMPIInstance* instance, const Proper
     if (!cim::hasValue(data)) {
         return std::nullopt;
     }
-    if (!isConvertible(data, property.type)) {
-        fail(CMPI_RC_ERR_TYPE_MISMATCH, std::string(property.name) + ": the value has another type than the property.");
-    }
+    failIf(!isConvertible(data, property.type), CMPI_RC_ERR_TYPE_MISMATCH, property.name,
+           ": the value has another type than the property.");
     auto characters = cim::charactersOf(data);
     if (cim::digitsOf(data) && !numberIn(*characters, property.type)) {
-        fail(CMPI_RC_ERR_TYPE_MISMATCH,
-             std::string(property.name) + ": " + *characters + " is out of the range of the property's type.");
+        fail(CMPI_RC_ERR_TYPE_MISMATCH, property.name, ": ", *characters,
+             " is out of the range of the property's type.");
     }
     return characters;
 }

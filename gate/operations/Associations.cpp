@@ -47,9 +47,8 @@ void requireEnumerated(bool isDone, const CMPIStatus& status) {
 
 CMPIEnumeration* enumerateComputers(const ClientRequest& request, ProviderSession& session) {
     const CMPIBroker* broker = session.broker();
-    if (broker->bft == nullptr || broker->bft->enumerateInstances == nullptr) {
-        fail(CMPI_RC_ERR_FAILED, "The object manager cannot enumerate computers.");
-    }
+    failIf(broker->bft == nullptr || broker->bft->enumerateInstances == nullptr, CMPI_RC_ERR_FAILED,
+           "The object manager cannot enumerate computers.");
     const CMPIObjectPath* classPath = makePath(broker, nameSpaceOf(request.path), computerClass);
     CMPIStatus status{CMPI_RC_OK, nullptr};
     CMPIEnumeration* computers = nullptr;
@@ -75,10 +74,9 @@ const CMPIObjectPath* computerPathOf(const ClientRequest& request, const CMPIBro
     const CMPICount count = keyCountOf(given);
     for (CMPICount index = 0; index < count; ++index) {
         CMPIString* keyName = nullptr;
-        const auto data = ask<&CMPIObjectPathFT::getKeyAt>(given, index, &keyName);
-        requireOk("name a computer", data.status);
+        const CMPIData key = demand<&CMPIObjectPathFT::getKeyAt>("name a computer", given, index, &keyName);
         requireOk("name a computer",
-                  tell<&CMPIObjectPathFT::addKey>(path, toString(keyName).c_str(), &data.value.value, data.value.type));
+                  tell<&CMPIObjectPathFT::addKey>(path, toString(keyName).c_str(), &key.value, key.type));
     }
     return path;
 }
@@ -194,9 +192,8 @@ std::vector<Traversal> traversalsFrom(const ClientRequest& request, const Traver
  */
 template <class Answers, class Make>
 Answers traverse(const ClientRequest& request, const TraversalFilter& filter, ElementForm form, Make make) {
-    if (keyCountOf(request.path) == 0) {
-        fail(CMPI_RC_ERR_INVALID_PARAMETER, "Associations begin at an instance: the path needs its keys.");
-    }
+    failIf(keyCountOf(request.path) == 0, CMPI_RC_ERR_INVALID_PARAMETER,
+           "Associations begin at an instance: the path needs its keys.");
     Answers answers;
     const std::vector<Traversal> traversals = traversalsFrom(request, filter);
     if (traversals.empty()) {
@@ -304,10 +301,8 @@ const CMPIInstance* associationAt(const ClientRequest& request, const Class& ass
     const CMPIObjectPath* computer = nullptr;
     for (const Property& end : association) {
         const CMPIObjectPath* target = referenceOf(request.path, end.name);
-        if (target == nullptr) {
-            fail(CMPI_RC_ERR_INVALID_PARAMETER,
-                 std::string("The path of a ") + association.name + " needs the key " + end.name + " as a reference.");
-        }
+        failIf(target == nullptr, CMPI_RC_ERR_INVALID_PARAMETER, "The path of a ", association.name, " needs the key ",
+               end.name, " as a reference.");
         computer = isComputerEnd(end) ? target : computer;
     }
     const Computers computers = computerAt(computer, knownComputers(request, session));
@@ -316,7 +311,7 @@ const CMPIInstance* associationAt(const ClientRequest& request, const Class& ass
             return associationInstance(request, pair);
         }
     }
-    fail(CMPI_RC_ERR_NOT_FOUND, std::string("There is no such ") + association.name + ".");
+    fail(CMPI_RC_ERR_NOT_FOUND, "There is no such ", association.name, ".");
 }
 
 }  // namespace gate

@@ -19,9 +19,8 @@ bool PropertySelection::has(const Property& property) const {
 
 void PropertySelection::requireKnown() const {
     for (const char* name : names) {
-        if (cim::findNamed(owner, name) == nullptr) {
-            fail(CMPI_RC_ERR_NO_SUCH_PROPERTY, std::string(owner.name) + " has no property " + name + ".");
-        }
+        failIf(cim::findNamed(owner, name) == nullptr, CMPI_RC_ERR_NO_SUCH_PROPERTY, owner.name, " has no property ",
+               name, ".");
     }
 }
 

@@ -116,9 +116,7 @@ void ProviderConnection::requireOwner(LockGuard& guard) {
         ownership = theDirectory.acquire();
         return ownership.isOtherProcess;
     });
-    if (!ownership.isOwner) {
-        fail(CMPI_RC_ERR_FAILED, ownership.reason);
-    }
+    failIf(!ownership.isOwner, CMPI_RC_ERR_FAILED, ownership.reason);
 }
 
 void ProviderConnection::requireCurrent(LockGuard& guard, bool mayBeOlder) {
@@ -132,11 +130,9 @@ void ProviderConnection::requireCurrent(LockGuard& guard, bool mayBeOlder) {
     if (isWaiting && !mayUseOlder) {
         waitWhile(guard, waitTimeout, update);
     }
-    if (isWaiting && !mayUseOlder) {
-        fail(CMPI_RC_ERR_FAILED,
-             upCalls != 0 ? "The provider waits for the object manager and cannot be loaded again. Try again."
-                          : "The record files are incomplete, or another process is writing them. Try again.");
-    }
+    failIf(isWaiting && !mayUseOlder, CMPI_RC_ERR_FAILED,
+           upCalls != 0 ? "The provider waits for the object manager and cannot be loaded again. Try again."
+                        : "The record files are incomplete, or another process is writing them. Try again.");
 }
 
 /**
@@ -144,9 +140,8 @@ void ProviderConnection::requireCurrent(LockGuard& guard, bool mayBeOlder) {
  * whether the files are complete and did not change during the call.
  */
 bool ProviderConnection::load() {
-    if (theDirectory.hasLostFiles()) {
-        fail(CMPI_RC_ERR_FAILED, "The record files were removed. Restore the data directory and try again.");
-    }
+    failIf(theDirectory.hasLostFiles(), CMPI_RC_ERR_FAILED,
+           "The record files were removed. Restore the data directory and try again.");
     if (!theDirectory.open()) {
         return false;  // a request may read the older tables
     }
@@ -176,8 +171,8 @@ void ProviderConnection::requireRead(const Class& owner, std::size_t count) {
     }
     if (count != counts[index]) {
         setOutdated();
-        fail(CMPI_RC_ERR_FAILED, std::string("The provider could not read the records of ") + owner.name +
-                                     "; see the agent's log at level 3000. It reads them again; repeat the request.");
+        fail(CMPI_RC_ERR_FAILED, "The provider could not read the records of ", owner.name,
+             "; see the agent's log at level 3000. It reads them again; repeat the request.");
     }
     table->isRead = true;
 }
@@ -189,9 +184,8 @@ void ProviderConnection::unload() {
 
 void ProviderConnection::createInterfaces() {
     providers = library.createInterfaces(wrapped->handle());
-    if (providers.instances == nullptr || providers.associations == nullptr) {
-        fail(CMPI_RC_ERR_FAILED, "The provider did not return its interfaces.");
-    }
+    failIf(providers.instances == nullptr || providers.associations == nullptr, CMPI_RC_ERR_FAILED,
+           "The provider did not return its interfaces.");
 }
 
 const CMPIBroker* ProviderConnection::broker() const {

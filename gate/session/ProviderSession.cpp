@@ -123,9 +123,8 @@ const CMPIBroker* ClientRequest::broker() const {
 const Class& ClientRequest::requestedClass() const {
     const std::string name = classNameOf(path);
     const Class* found = findClass(name);
-    if (found == nullptr || sameName(name, computerClass)) {
-        fail(CMPI_RC_ERR_INVALID_CLASS, "This provider does not serve the class \"" + name + "\".");
-    }
+    failIf(found == nullptr || sameName(name, computerClass), CMPI_RC_ERR_INVALID_CLASS,
+           "This provider does not serve the class \"", name, "\".");
     return *found;
 }
 
@@ -196,9 +195,7 @@ const CMPIInstance* ProviderSession::find(const LocalObject& keys, const Class& 
 
 const CMPIInstance* ProviderSession::get(const LocalObject& keys, const Class& owner) const {
     const CMPIInstance* instance = find(keys, owner);
-    if (instance == nullptr) {
-        fail(CMPI_RC_ERR_NOT_FOUND, std::string("There is no such ") + owner.name + ".");
-    }
+    failIf(instance == nullptr, CMPI_RC_ERR_NOT_FOUND, "There is no such ", owner.name, ".");
     return instance;
 }
 

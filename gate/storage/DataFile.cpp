@@ -2,10 +2,10 @@
 
 #include <fcntl.h>
 #include <sys/stat.h>
-#include <sys/statvfs.h>
 #include <unistd.h>
 
 #include <algorithm>
+#include <cctype>
 #include <cerrno>
 #include <filesystem>
 #include <sstream>
@@ -30,7 +30,7 @@ std::string pathOf(const DataFile& file) {
 }
 
 [[noreturn]] void failToStore(const std::string& path, const std::string& reason) {
-    fail(CMPI_RC_ERR_FAILED, "The change cannot be stored in " + path + ": " + reason + ".");
+    fail(CMPI_RC_ERR_FAILED, "The change cannot be stored in ", path, ": ", reason, ".");
 }
 
 /** Fails if the file exists and cannot be written or is not a regular file. */
@@ -53,22 +53,16 @@ void requireWritableFile(const std::string& path) {
 /** Whether the file system has room for the file's growth and for a block that is partly used. */
 bool hasRoom(const std::string& directory, std::size_t growth) {
     constexpr std::size_t block = 4096;
-    struct statvfs system {};
-    const bool isKnown = statvfs(directory.c_str(), &system) == 0 && system.f_blocks != 0 && system.f_frsize != 0;
-    if (growth == 0 || !isKnown) {
-        return true;  // unknown; the check after the change decides
-    }
-    const auto blocks = geteuid() == 0 ? system.f_bfree : system.f_bavail;  // the last blocks are reserved for root
-    return blocks > (growth + block) / system.f_frsize;
+    std::error_code error;
+    const auto space = std::filesystem::space(directory, error);
+    const bool isKnown = !error && space.capacity != 0;               // otherwise, the check after the change decides
+    const auto room = geteuid() == 0 ? space.free : space.available;  // the last blocks are reserved for root
+    return growth == 0 || !isKnown || room > growth + block;
 }
 
 /** Whether the provider splits a record file at a character. */
 bool isSpace(char each) {
     return std::string_view(" \t\n\v\f\r").find(each) != std::string_view::npos;
-}
-
-bool isDigit(char each) {
-    return each >= '0' && each <= '9';
 }
 
 /** Whether a line of a record file is the identifier, and the provider reads it as one. */
@@ -111,7 +105,8 @@ bool DataFile::mayHave(const std::string& content, std::string identifier) const
         const std::size_t end = start + identifier.size();
         const bool isEnded = end == content.size() || isSpace(content[end]);
         // A word also begins after a number that is followed by other characters.
-        return isEnded && (start == 0 || isSpace(content[start - 1]) || isDigit(content[start - 1]));
+        return isEnded && (start == 0 || isSpace(content[start - 1]) ||
+                           std::isdigit(static_cast<unsigned char>(content[start - 1])) != 0);
     };
     std::size_t found = content.find(identifier);
     while (found != std::string::npos && !isWord(found)) {
@@ -137,15 +132,13 @@ void DataFile::commit(const FileState& before, bool mustDiffer, const std::strin
         return;
     }
     const FileState now = state();
-    if (mustDiffer && now == before) {
-        fail(CMPI_RC_ERR_FAILED, std::string(fileName) + " was not written.");
-    }
+    failIf(mustDiffer && now == before, CMPI_RC_ERR_FAILED, fileName, " was not written.");
     const durable::RecordFile file = records();
     if (!file.isComplete(now.content)) {
         failToStore(file.path(), "it does not hold all records; the disk may be full");
     }
     if (identifier != nullptr && !hasRecord(now.content, *identifier)) {
-        fail(CMPI_RC_ERR_FAILED, std::string(fileName) + " does not hold " + *identifier + ".");
+        fail(CMPI_RC_ERR_FAILED, fileName, " does not hold ", *identifier, ".");
     }
     file.commit(now.content);
 }

@@ -29,11 +29,6 @@ std::string storedValue(const Property& property, const std::string& returned) {
     return isPersonalized(property) && returned == "Null" ? std::string() : returned;
 }
 
-/** The value in a record file of a property that is null. */
-std::string storedNull(const Property& property) {
-    return isDate(property) ? std::string(cim::noDate) : property.type == CMPI_string ? "" : "0";
-}
-
 /** The datetime with the offset "-000", if it is zero: "+000" is equal. */
 std::string normalized(const std::string& dateTime) {
     constexpr std::string_view zero = "+000";
@@ -117,9 +112,8 @@ void requireNothingLost(const Class& owner, const DataFile& file, const CMPIInst
         const std::string value = propertyOf(before, property).value_or(std::string());
         const std::string now = propertyOf(after, property).value_or(std::string());
         const bool isLost = storedValue(property, now).empty() && !storedValue(property, value).empty();
-        if (isLost && !isAmong(property, changes) && !isRemoved(value, file, before, changes)) {
-            fail(CMPI_RC_ERR_FAILED, std::string(property.name) + " was lost: the data file could not be read.");
-        }
+        failIf(isLost && !isAmong(property, changes) && !isRemoved(value, file, before, changes), CMPI_RC_ERR_FAILED,
+               property.name, " was lost: the data file could not be read.");
     }
 }
 
@@ -128,10 +122,8 @@ void requireNothingLost(const Class& owner, const DataFile& file, const CMPIInst
 void requireRoundTrip(const DataFile& file, const Values& values) {
     for (const auto& [property, value] : values) {
         const char* loss = property->isKey || property->isWritable ? lossOf(file, *property, value) : nullptr;
-        if (loss != nullptr && refusesLossyValues()) {
-            fail(CMPI_RC_ERR_INVALID_PARAMETER, std::string(file.name) + '.' + property->name + ": the value \"" +
-                                                    value + "\" cannot be stored unchanged: " + loss + ".");
-        }
+        failIf(loss != nullptr && refusesLossyValues(), CMPI_RC_ERR_INVALID_PARAMETER, file.name, '.', property->name,
+               ": the value \"", value, "\" cannot be stored unchanged: ", loss, ".");
     }
 }
 
@@ -142,10 +134,8 @@ Values diff(const CMPIInstance* current, const Values& given, bool areListed) {
         if (isClock || isCurrent(*property, current, value, areListed)) {
             continue;
         }
-        if (!property->isWritable) {
-            fail(CMPI_RC_ERR_INVALID_PARAMETER,
-                 std::string(property->name) + " is read-only. Omit it, or send it back unchanged.");
-        }
+        failIf(!property->isWritable, CMPI_RC_ERR_INVALID_PARAMETER, property->name,
+               " is read-only. Omit it, or send it back unchanged.");
         const bool isNoDate = isDate(*property) && cim::isNoDate(value);
         changes.emplace_back(property, isNoDate ? std::string(cim::noDate) : value);
     }
@@ -161,7 +151,7 @@ Values valuesToSend(const Class& owner, const CMPIInstance* current, const Value
         const auto value = propertyOf(current, property);
         if (!value) {
             // These properties are never null, unless the provider could not read the file.
-            fail(CMPI_RC_ERR_FAILED, std::string(property.name) + " cannot be read, so nothing is changed.");
+            fail(CMPI_RC_ERR_FAILED, property.name, " cannot be read, so nothing is changed.");
         }
         values.emplace_back(&property, storedValue(property, *value));
     }
@@ -171,7 +161,8 @@ Values valuesToSend(const Class& owner, const CMPIInstance* current, const Value
 bool altersFile(const DataFile& file, const CMPIInstance* current, const Values& changes) {
     return std::any_of(changes.begin(), changes.end(), [&](const auto& change) {
         const auto& [property, value] = change;
-        const std::string before = propertyOf(current, *property).value_or(storedNull(*property));
+        const char* null = isDate(*property) ? cim::noDate.data() : property->type == CMPI_string ? "" : "0";
+        const std::string before = propertyOf(current, *property).value_or(null);
         return before != value && lossOf(file, *property, before) == nullptr &&
                lossOf(file, *property, value) == nullptr;
     });
@@ -186,10 +177,8 @@ void requireChanged(const Class& owner, const DataFile& file, const CMPIInstance
         const bool isNull = !now && isDate(*property) && !isRepresentable(file, value);
         // The provider may return a word for an empty value: it suffices that it is not the former value.
         const bool isEmptied = value.empty() && now != propertyOf(before, *property);
-        if (!isEqual && !isNull && !isEmptied) {
-            fail(CMPI_RC_ERR_FAILED,
-                 std::string(property->name) + " could not be stored; see the agent's log at level 3000.");
-        }
+        failIf(!isEqual && !isNull && !isEmptied, CMPI_RC_ERR_FAILED, property->name,
+               " could not be stored; see the agent's log at level 3000.");
     }
 }
 

@@ -26,7 +26,7 @@ auto onFiles(Work work) {
     try {
         return work();
     } catch (const std::system_error& error) {
-        fail(CMPI_RC_ERR_FAILED, std::string("The change cannot be stored in ") + error.what() + ".");
+        fail(CMPI_RC_ERR_FAILED, "The change cannot be stored in ", error.what(), ".");
     }
 }
 
@@ -68,7 +68,7 @@ void Transaction::run(FileState before, Change change) const {
         if (note.empty()) {
             throw;
         }
-        fail(CMPI_RC_ERR_FAILED, std::string("The request failed: ") + exception.what() + "." + note);
+        fail(CMPI_RC_ERR_FAILED, "The request failed: ", exception.what(), ".", note);
     } catch (...) {
         rollBack(before);
         throw;
@@ -94,7 +94,8 @@ void Transaction::create(const std::string& identifier, const Values& given, con
     requireRoundTrip(file, {{cim::findNamed(owner, identifierKey), identifier}});
     requireRoundTrip(file, given);
     const FileState start = open(identifier.size() + 1 + sizeOf(given));
-    requireNew(identifier, start.content);
+    const bool exists = file.mayHave(start.content, identifier) && session.find(path, owner) != nullptr;
+    failIf(exists, CMPI_RC_ERR_ALREADY_EXISTS, owner.name, " ", identifier, " already exists.");
     requireReadOnlyValues(given, start.content);
     run(start, [&](const FileState& before) {
         const CMPIInstance* current = session.create(path);
@@ -143,8 +144,8 @@ void Transaction::requireTable() const {
     }
     if (!hasCount(file.records(), paths.size())) {
         session.setOutdated();
-        fail(CMPI_RC_ERR_FAILED, std::string(file.fileName) +
-                                     " has other records than the provider. It is read again; repeat the request.");
+        fail(CMPI_RC_ERR_FAILED, file.fileName,
+             " has other records than the provider. It is read again; repeat the request.");
     }
     theConnection.setVerified(owner);
 }
@@ -158,13 +159,6 @@ void Transaction::storeTable(const CMPIObjectPath* record) const {
     const std::string current = propertyOf(session.get(changed, owner), *number).value();
     session.modify(changed, LocalObject({}, owner, {{number, current}}));
     file.commit({}, true);
-}
-
-/** Fails if there is a record with the identifier. Asks the provider only if the file may have one. */
-void Transaction::requireNew(const std::string& identifier, const std::string& content) const {
-    if (file.mayHave(content, identifier) && session.find(path, owner) != nullptr) {
-        fail(CMPI_RC_ERR_ALREADY_EXISTS, std::string(owner.name) + " " + identifier + " already exists.");
-    }
 }
 
 /** A record of the file; null if it has none. Lists the names only if it has lost the first record's identifier. */

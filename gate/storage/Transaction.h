@@ -44,7 +44,6 @@ private:
     void apply(const CMPIInstance* current, const Values& changes) const;
     void requireTable() const;
     void storeTable(const CMPIObjectPath* record) const;
-    void requireNew(const std::string& identifier, const std::string& content) const;
     const CMPIInstance* anyRecord(const std::string& content) const;
     void requireReadOnlyValues(const Values& given, const std::string& content) const;
 
