@@ -46,7 +46,7 @@ void requireEnumerated(bool isDone, const CMPIStatus& status) {
 }
 
 CMPIEnumeration* enumerateComputers(const ClientRequest& request, ProviderSession& session) {
-    const CMPIBroker* broker = session.broker();
+    const CMPIBroker* broker = request.broker();
     failIf(broker->bft == nullptr || broker->bft->enumerateInstances == nullptr, CMPI_RC_ERR_FAILED,
            "The object manager cannot enumerate computers.");
     const CMPIObjectPath* classPath = makePath(broker, nameSpaceOf(request.path), computerClass);
@@ -89,7 +89,7 @@ Computers knownComputers(const ClientRequest& request, ProviderSession& session)
         const auto next = ask<&CMPIEnumerationFT::getNext>(enumeration);
         CMPIInstance* instance = next.isOk() ? cim::elementInstance(next.value) : nullptr;
         requireEnumerated(instance != nullptr, next.status);
-        const CMPIObjectPath* path = computerPathOf(request, session.broker(), instance);
+        const CMPIObjectPath* path = computerPathOf(request, request.broker(), instance);
         if (nameSpaceOf(pathOf(instance)).empty()) {
             // Makes the instance's path complete, too, if the manager can.
             tell<&CMPIInstanceFT::setObjectPath>(instance, path);

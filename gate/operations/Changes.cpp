@@ -58,7 +58,7 @@ void createInstance(const ClientRequest& request, const CMPIInstance* instance) 
     requireKnownProperties(requested, instance);
     const Values given = valuesOf(instance, requested, [](const Property& property) { return !property.isKey; });
     const std::string nameSpace = nameSpaceOf(request.path);
-    CMPIObjectPath* created = makePath(session.broker(), nameSpace, requested.name);
+    CMPIObjectPath* created = makePath(request.broker(), nameSpace, requested.name);
     // In CMPI, the pointer to a value of type CMPI_chars is the pointer to its characters.
     addKey(created, key.name, reinterpret_cast<const CMPIValue*>(identifier.c_str()), CMPI_chars);
     const Paths answer{created};

@@ -65,7 +65,7 @@ Instances instancesOf(const ClientRequest& request, const Class& requested, cons
     const PropertySelection selection(properties, requested);
     Instances instances = session.instances(requested);
     for (const CMPIInstance*& instance : instances) {
-        instance = selection.applied(session.broker(), instance);
+        instance = selection.applied(request.broker(), instance);
     }
     return instances;
 }
@@ -73,7 +73,7 @@ Instances instancesOf(const ClientRequest& request, const Class& requested, cons
 const CMPIInstance* instanceAt(const ClientRequest& request, const Class& requested, const char** properties) {
     const ProviderSession session(request);
     const CMPIInstance* instance = session.get(localPath(request.path, requested), requested);
-    return PropertySelection(properties, requested).applied(session.broker(), instance);
+    return PropertySelection(properties, requested).applied(request.broker(), instance);
 }
 
 }  // namespace

@@ -161,10 +161,10 @@ bool ProviderConnection::load() {
 }
 
 void ProviderConnection::requireRead(const Class& owner, std::size_t count) {
-    if (hasRead(owner)) {
+    Table* const table = tableOf(owner);
+    if (table == nullptr || table->isRead) {
         return;
     }
-    Table* const table = tableOf(owner);
     const auto index = static_cast<std::size_t>(table - tables.data());
     if (!counts[index]) {  // the gate could not read the file, but the provider may have
         counts[index] = theDirectory.recordCounts()[index];

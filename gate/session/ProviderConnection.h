@@ -45,6 +45,13 @@ private:
 /** The process's only connection between the provider and an object manager. Loads and unloads the provider. */
 class ProviderConnection {
 public:
+    /** The provider's table of a record file. */
+    struct Table {
+        const char* name;         ///< of the class
+        bool isRead = false;      ///< whether it is known that the provider has read the file
+        bool isVerified = false;  ///< whether it has been compared with the file since the provider was loaded
+    };
+
     constexpr ProviderConnection() = default;
 
     /**
@@ -86,12 +93,8 @@ public:
      */
     void requireCurrent(LockGuard& guard, bool mayBeOlder);
 
-    /** @name Whether the table of a class with a record file has been compared with its file since it was read */
-    bool isVerified(const Class& owner) { return tableOf(owner)->isVerified; }
-    void setVerified(const Class& owner) { tableOf(owner)->isVerified = true; }
-
-    /** Whether it is known that the provider has read the record file of a class, or the class has none. */
-    bool hasRead(const Class& owner) { return tableOf(owner) == nullptr || tableOf(owner)->isRead; }
+    /** The provider's table of a class; null if the class has no record file. */
+    Table* tableOf(const Class& owner) { return cim::findNamed(tables, owner.name); }
 
     /**
      * Fails with CMPI_RC_ERR_FAILED unless the provider has as many records of a class as the file had when the
@@ -101,15 +104,6 @@ public:
     ///@}
 
 private:
-    /** The provider's table of a record file. */
-    struct Table {
-        const char* name;  ///< of the class
-        bool isRead = false;
-        bool isVerified = false;
-    };
-
-    Table* tableOf(const Class& owner) { return cim::findNamed(tables, owner.name); }
-
     bool load();
     void unload();
     void createInterfaces();

@@ -152,17 +152,19 @@ Paths ProviderSession::names(const Class& owner) const {
     return paths;
 }
 
-/** Fails unless the provider has read the records of a class. Lists them once after the provider was loaded. */
+/**
+ * Fails unless the provider has read the records of a class, or of both classes that an association connects. Lists
+ * them once after the provider was loaded.
+ */
 void ProviderSession::requireRead(const Class& owner) const {
-    if (!theConnection.hasRead(owner)) {
-        names(owner);
+    for (const Property& property : owner) {
+        if (property.referenceClass != nullptr) {
+            requireRead(*findClass(property.referenceClass));
+        }
     }
-}
-
-/** The same for the class that an association connects with computers. */
-void ProviderSession::requireElementsRead(const Class& association) const {
-    for (const Property& end : association) {
-        requireRead(*findClass(end.referenceClass));
+    const auto* table = theConnection.tableOf(owner);
+    if (table != nullptr && !table->isRead) {
+        names(owner);
     }
 }
 
@@ -173,12 +175,12 @@ Instances ProviderSession::instances(const Class& owner) const {
 }
 
 Paths ProviderSession::associatorNames(const LocalObject& computer, const Class& association) const {
-    requireElementsRead(association);
+    requireRead(association);
     return read<&CMPIAssociationMIFT::associatorNames>(request, computer, association.name, any, any, any).paths;
 }
 
 Instances ProviderSession::associators(const LocalObject& computer, const Class& association) const {
-    requireElementsRead(association);
+    requireRead(association);
     return read<&CMPIAssociationMIFT::associators>(request, computer, association.name, any, any, any, allProperties)
         .instances;
 }

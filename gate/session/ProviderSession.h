@@ -65,8 +65,6 @@ public:
     /** Begins the session. For a change, this process must own the data directory. */
     explicit ProviderSession(const ClientRequest& itsRequest, Access access = Access::read);
 
-    const CMPIBroker* broker() const { return request.broker(); }
-
     /** @name All instances of a class, in the request's namespace */
     ///@{
     Paths names(const Class& owner) const;
@@ -90,9 +88,6 @@ public:
     void modify(const LocalObject& keys, const LocalObject& values);
     void remove(const LocalObject& keys);
 
-    /** Marks the provider's tables as wrong: it is loaded again before the next request. */
-    void setOutdated() const { theConnection.setOutdated(); }
-
     /**
      * Releases the lock for a call of the object manager that may take long or lead back to the gate. Another request
      * may load the provider again meanwhile.
@@ -105,7 +100,6 @@ public:
 
 private:
     void requireRead(const Class& owner) const;
-    void requireElementsRead(const Class& association) const;
 
     LockGuard guard;
     const ClientRequest& request;

@@ -79,7 +79,7 @@ void Transaction::run(FileState before, Change change) const {
 std::string Transaction::rollBack(const FileState& before) const {
     try {
         if (file.hasRecords && !before.restorable.empty()) {
-            session.setOutdated();
+            theConnection.setOutdated();
         }
         onFiles([&] { file.rollBack(before); });
         return {};
@@ -135,7 +135,7 @@ void Transaction::apply(const CMPIInstance* current, const Values& changes) cons
  * report that it could not read the file.
  */
 void Transaction::requireTable() const {
-    if (!file.hasRecords || (theConnection.isVerified(owner) && file.records().isStored())) {
+    if (!file.hasRecords || (theConnection.tableOf(owner)->isVerified && file.records().isStored())) {
         return;
     }
     const Paths paths = session.names(owner);
@@ -143,11 +143,11 @@ void Transaction::requireTable() const {
         storeTable(paths.front());
     }
     if (!hasCount(file.records(), paths.size())) {
-        session.setOutdated();
+        theConnection.setOutdated();
         fail(CMPI_RC_ERR_FAILED, file.fileName,
              " has other records than the provider. It is read again; repeat the request.");
     }
-    theConnection.setVerified(owner);
+    theConnection.tableOf(owner)->isVerified = true;
 }
 
 /** Stores records that are only in memory, since their file was removed, by setting a value to itself. */
