@@ -62,11 +62,11 @@ CMPIInstanceFT LocalObject::instanceFunctions = [] {
 LocalObject localPath(const CMPIObjectPath* path, const Class& named) {
     Values keys;
     for (const Property& property : named) {
-        auto value = property.isKey ? keyOf(path, property) : std::nullopt;
-        failIf(property.isKey && !value, CMPI_RC_ERR_INVALID_PARAMETER, "The path of a ", named.name, " needs the key ",
-               property.name, " as a string.");
-        if (value) {
-            keys.emplace_back(&property, std::move(*value));
+        if (property.isKey) {
+            const auto value = keyOf(path, property);
+            failIf(!value, CMPI_RC_ERR_INVALID_PARAMETER, "The path of a ", named.name, " needs the key ",
+                   property.name, " as a string.");
+            keys.emplace_back(&property, *value);
         }
     }
     return LocalObject(nameSpaceOf(path), named, keys);

@@ -196,8 +196,14 @@ const CMPIBroker* ProviderConnection::broker() const {
 void ProviderConnection::shutdown(const CMPIContext* context) {
     std::exception_ptr failure;
     theRequestLock.close(drainTimeout, RequestLock::Closing::temporary, [&] {
+        const auto [instances, associations] = providers;
         try {
-            endProvider(context);
+            if (broker() != nullptr && instances != nullptr && associations != nullptr) {
+                instances->ft->cleanup(instances, context, 1);
+                associations->ft->cleanup(associations, context, 1);
+            }
+            set(nullptr);
+            endProcess();
         } catch (...) {
             failure = std::current_exception();
         }
@@ -220,16 +226,6 @@ void ProviderConnection::set(const CMPIBroker* manager) {
     const std::lock_guard<std::mutex> lock(mutex);
     managersOwn = manager;
     brokersTables = manager == nullptr ? CMPIBroker{} : *manager;
-}
-
-void ProviderConnection::endProvider(const CMPIContext* context) {
-    const auto [instances, associations] = providers;
-    if (broker() != nullptr && instances != nullptr && associations != nullptr) {
-        instances->ft->cleanup(instances, context, 1);
-        associations->ft->cleanup(associations, context, 1);
-    }
-    set(nullptr);
-    endProcess();
 }
 
 void ProviderConnection::endProcess() {

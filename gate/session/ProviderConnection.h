@@ -109,7 +109,6 @@ private:
     void createInterfaces();
     bool isConnectedTo(const CMPIBroker* manager) const;
     void set(const CMPIBroker* manager);
-    void endProvider(const CMPIContext* context);
 
     ProviderLibrary library{};
     bool isOutdated = false;

@@ -9,18 +9,16 @@ namespace {
 constexpr const char** allProperties = nullptr;
 constexpr const char* any = nullptr;
 
-template <auto function, class... Answer>
-void callResult(const ClientRequest& request, Answer... answer) {
-    request.requireManager();
-    requireOk("accept the answer", tell<function>(request.result, answer...));
-}
-
+/** Returns answers with a function of the request's result. */
 template <auto function, class Answer>
 void giveAll(const ClientRequest& request, const std::vector<Answer>& answers) {
+    constexpr const char* task = "accept the answer";
     for (const Answer& answer : answers) {
-        callResult<function>(request, answer);
+        request.requireManager();
+        requireOk(task, tell<function>(request.result, answer));
     }
-    callResult<&CMPIResultFT::returnDone>(request);
+    request.requireManager();
+    requireOk(task, tell<&CMPIResultFT::returnDone>(request.result));
 }
 
 [[noreturn]] void failUnfinished() {

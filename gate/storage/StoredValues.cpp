@@ -149,10 +149,8 @@ Values valuesToSend(const Class& owner, const CMPIInstance* current, const Value
             continue;
         }
         const auto value = propertyOf(current, property);
-        if (!value) {
-            // These properties are never null, unless the provider could not read the file.
-            fail(CMPI_RC_ERR_FAILED, property.name, " cannot be read, so nothing is changed.");
-        }
+        // These properties are never null, unless the provider could not read the file.
+        failIf(!value, CMPI_RC_ERR_FAILED, property.name, " cannot be read, so nothing is changed.");
         values.emplace_back(&property, storedValue(property, *value));
     }
     return values;
