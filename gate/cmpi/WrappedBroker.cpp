@@ -25,7 +25,6 @@ struct Forward;
 
 template <class Table, class Result, class... Arguments, Result (*Table::*slot)(const CMPIBroker*, Arguments...)>
 struct Forward<slot> {
-    static constexpr bool isService = std::is_same_v<Table, CMPIBrokerFT>;
     static constexpr bool makesAnswers =
         std::is_same_v<Result, CMPIInstance*> || std::is_same_v<Result, CMPIObjectPath*>;
 
@@ -33,7 +32,7 @@ struct Forward<slot> {
         auto& wrapper = *static_cast<WrappedBroker*>(broker->hdl);
         const CMPIBroker* manager = wrapper.manager();
         const auto function = std::get<Table*>(std::tuple(manager->bft, manager->eft, manager->mft))->*slot;
-        if constexpr (isService) {
+        if constexpr (std::is_same_v<Table, CMPIBrokerFT>) {
             const ScopedRelease scopedRelease(wrapper.lock());
             return function(manager, arguments...);
         } else if constexpr (makesAnswers) {

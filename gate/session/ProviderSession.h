@@ -4,7 +4,7 @@
 #include <vector>
 
 #include "ProviderConnection.h"
-#include "gate/cmpi/LocalObject.h"
+#include "gate/cmpi/Objects.h"
 
 namespace gate {
 

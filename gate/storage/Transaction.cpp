@@ -30,17 +30,7 @@ auto onFiles(Work work) {
     }
 }
 
-/** Whether a record file needs no recovery and has this number of records. */
-bool hasCount(const durable::RecordFile& file, std::size_t count) {
-    const auto promised = durable::RecordFile::promisedIn(file.content().value_or(std::string()));
-    return !file.needsRecovery() && promised.value_or(0) == count;
-}
-
 }  // namespace
-
-Transaction::Transaction(ProviderSession& itsSession, const Class& itsClass, const DataFile& itsFile,
-                         const LocalObject& itsPath)
-    : session(itsSession), owner(itsClass), file(itsFile), path(itsPath) {}
 
 /** Returns the state of the file before a change. Fails if the change cannot be written or would lose records. */
 FileState Transaction::open(std::size_t growth) const {
@@ -142,7 +132,9 @@ void Transaction::requireTable() const {
     if (!paths.empty() && !file.records().isStored()) {
         storeTable(paths.front());
     }
-    if (!hasCount(file.records(), paths.size())) {
+    const durable::RecordFile records = file.records();
+    const auto promised = durable::RecordFile::promisedIn(records.content().value_or(std::string()));
+    if (promised.value_or(0) != paths.size() || records.needsRecovery()) {
         theConnection.setOutdated();
         fail(CMPI_RC_ERR_FAILED, file.fileName,
              " has other records than the provider. It is read again; repeat the request.");

@@ -20,8 +20,8 @@ namespace gate {
  */
 class Transaction {
 public:
-    Transaction(ProviderSession& itsSession, const Class& itsClass, const DataFile& itsFile,
-                const LocalObject& itsPath);
+    Transaction(ProviderSession& itsSession, const Class& itsClass, const DataFile& itsFile, const LocalObject& itsPath)
+        : session(itsSession), owner(itsClass), file(itsFile), path(itsPath) {}
 
     /**
      * Creates a record with these values. Fails with CMPI_RC_ERR_ALREADY_EXISTS if there is one with the identifier.
