@@ -1,5 +1,5 @@
 #include "SystemUnderTest.h"
-#include "gate/session/ProviderLibrary.h"
+#include "gate/session/ProviderConnection.h"
 
 // The gate as the system under test. Its provider is linked into the fuzzer, too: loading it only destroys and reads
 // its tables.
@@ -28,14 +28,10 @@ void ProviderLibrary::unload() {
     handle = nullptr;
 }
 
-CMPIInstanceMI* ProviderLibrary::createInstanceMI(const CMPIBroker* broker) const {
+ProviderInterfaces ProviderLibrary::createInterfaces(const CMPIBroker* broker) const {
     CMPIStatus status{CMPI_RC_OK, nullptr};
-    return LeaseAndWarrantyProvider_Create_InstanceMI(broker, nullptr, &status);
-}
-
-CMPIAssociationMI* ProviderLibrary::createAssociationMI(const CMPIBroker* broker) const {
-    CMPIStatus status{CMPI_RC_OK, nullptr};
-    return LeaseAndWarrantyProvider_Create_AssociationMI(broker, nullptr, &status);
+    return {LeaseAndWarrantyProvider_Create_InstanceMI(broker, nullptr, &status),
+            LeaseAndWarrantyProvider_Create_AssociationMI(broker, nullptr, &status)};
 }
 
 }  // namespace gate

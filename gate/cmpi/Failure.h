@@ -18,8 +18,20 @@ struct Failure {
 /** Ends a request whose object manager is shutting down or has ended. Its broker must not be used any more. */
 struct ManagerGone {};
 
-[[noreturn]] inline void fail(CMPIrc rc, std::string message) {
+/** Ends a request with a status and the message that the parts form. */
+template <class... Parts>
+[[noreturn]] void fail(CMPIrc rc, const Parts&... parts) {
+    std::string message;
+    ((message += parts), ...);
     throw Failure{rc, std::move(message)};
+}
+
+/** The same if a condition is true. */
+template <class... Parts>
+void failIf(bool isFailure, CMPIrc rc, const Parts&... parts) {
+    if (isFailure) {
+        fail(rc, parts...);
+    }
 }
 
 /** Writes an error to the log and trace of the agent. If the process is out of memory, nothing is written. */

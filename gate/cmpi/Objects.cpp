@@ -22,14 +22,6 @@ void logError(const std::string& message, const char* function, const char* file
     }
 }
 
-std::string toString(const CMPIString* string) {
-    return cim::charactersOf(string).value_or(std::string());
-}
-
-bool isAbsent(const CMPIStatus& status) {
-    return status.rc == CMPI_RC_ERR_NOT_FOUND || status.rc == CMPI_RC_ERR_NO_SUCH_PROPERTY;
-}
-
 std::string managerFailure(const char* task, const CMPIStatus& status) {
     std::string message = std::string("The object manager could not ") + task;
     if (status.rc != CMPI_RC_OK) {
@@ -81,61 +73,18 @@ namespace {
 /** Whether a value is accepted for a property of a type: managers do not keep types apart strictly. */
 bool isConvertible(const CMPIData& data, CMPIType wanted) {
     const bool isString = data.type == CMPI_string || data.type == CMPI_chars;
-    switch (wanted) {
-        case CMPI_string:
-            return isString;
-        case CMPI_dateTime:
-            return isString || data.type == CMPI_dateTime;
-        case CMPI_boolean:
-            return data.type == CMPI_boolean;
-        default:
-            return cim::digitsOf(data).has_value();
-    }
+    return wanted == CMPI_string     ? isString
+           : wanted == CMPI_dateTime ? isString || data.type == CMPI_dateTime
+           : wanted == CMPI_boolean  ? data.type == CMPI_boolean
+                                     : cim::digitsOf(data).has_value();
 }
 
 /** The number that the digits represent; none if it is out of the range of its type. */
-template <class Number>
-std::optional<Number> numberIn(const std::string& digits) {
-    Number number = 0;
+std::optional<CMPIUint32> numberIn(const std::string& digits, CMPIType type) {
+    CMPIUint32 number = 0;
     const auto error = std::from_chars(digits.data(), digits.data() + digits.size(), number).ec;
-    return error == std::errc() ? std::optional<Number>(number) : std::nullopt;
-}
-
-/** Whether an integer is in the range of its type; true for other types. */
-bool fits(const std::string& characters, CMPIType wanted) {
-    return wanted == CMPI_uint32   ? numberIn<CMPIUint32>(characters).has_value()
-           : wanted == CMPI_uint16 ? numberIn<CMPIUint16>(characters).has_value()
-                                   : true;
-}
-
-void add(CMPIObjectPath* path, const char* name, const CMPIValue* value, CMPIType type) {
-    requireOk("add a key", tell<&CMPIObjectPathFT::addKey>(path, name, value, type));
-}
-
-CMPIValue reference(const CMPIObjectPath* target) {
-    CMPIValue value{};
-    value.ref = const_cast<CMPIObjectPath*>(target);
-    return value;
-}
-
-/** Converts the result of a getter for a property; none if the value is absent or null. Fails if the getter failed. */
-std::optional<std::string> convert(const CMPIData& data, const CMPIStatus& status, const Property& property) {
-    if (isAbsent(status)) {
-        return std::nullopt;
-    }
-    requireOk((std::string("return the value of ") + property.name).c_str(), status);
-    if (!cim::hasValue(data)) {
-        return std::nullopt;
-    }
-    if (!isConvertible(data, property.type)) {
-        fail(CMPI_RC_ERR_TYPE_MISMATCH, std::string(property.name) + ": the value has another type than the property.");
-    }
-    auto characters = cim::charactersOf(data);
-    if (characters && !fits(*characters, property.type)) {
-        fail(CMPI_RC_ERR_TYPE_MISMATCH,
-             std::string(property.name) + ": " + *characters + " is out of the range of the property's type.");
-    }
-    return characters;
+    const CMPIUint32 limit = type == CMPI_uint16 ? 0xFFFFU : 0xFFFFFFFFU;
+    return error == std::errc() && number <= limit ? std::optional<CMPIUint32>(number) : std::nullopt;
 }
 
 /** Whether the second path has that key of the first one. */
@@ -155,8 +104,22 @@ bool sameKey(const CMPIData& key, const char* name, const CMPIObjectPath* other)
 }  // namespace
 
 std::optional<std::string> propertyOf(const CMPIInstance* instance, const Property& property) {
-    const auto answer = ask<&CMPIInstanceFT::getProperty>(instance, property.name);
-    return convert(answer.value, answer.status, property);
+    const auto [data, status] = ask<&CMPIInstanceFT::getProperty>(instance, property.name);
+    if (isAbsent(status)) {
+        return std::nullopt;
+    }
+    requireOk((std::string("return the value of ") + property.name).c_str(), status);
+    if (!cim::hasValue(data)) {
+        return std::nullopt;
+    }
+    failIf(!isConvertible(data, property.type), CMPI_RC_ERR_TYPE_MISMATCH, property.name,
+           ": the value has another type than the property.");
+    auto characters = cim::charactersOf(data);
+    if (cim::digitsOf(data) && !numberIn(*characters, property.type)) {
+        fail(CMPI_RC_ERR_TYPE_MISMATCH, property.name, ": ", *characters,
+             " is out of the range of the property's type.");
+    }
+    return characters;
 }
 
 std::optional<std::string> keyOf(const CMPIObjectPath* path, const Property& property) {
@@ -173,29 +136,21 @@ CMPIObjectPath* referenceOf(const CMPIObjectPath* path, const char* key) {
 
 CMPIValue scalarFrom(const std::string& characters, CMPIType type) {
     CMPIValue value{};
+    const CMPIUint32 number = numberIn(characters, type).value_or(0);
     if (type == CMPI_boolean) {
         value.boolean = characters == "true" ? 1 : 0;
     } else if (type == CMPI_uint16) {
-        value.uint16 = numberIn<CMPIUint16>(characters).value_or(0);
+        value.uint16 = static_cast<CMPIUint16>(number);
     } else {
-        value.uint32 = numberIn<CMPIUint32>(characters).value_or(0);
+        value.uint32 = number;
     }
     return value;
 }
 
-void setReference(const CMPIInstance* instance, const char* name, const CMPIObjectPath* target) {
-    const CMPIValue value = reference(target);
-    requireOk("set a property", tell<&CMPIInstanceFT::setProperty>(instance, name, &value, CMPIType{CMPI_ref}));
-}
-
-void addKey(CMPIObjectPath* path, const char* name, const std::string& characters) {
-    // In CMPI, the pointer to a value of type CMPI_chars is the pointer to its characters.
-    add(path, name, reinterpret_cast<const CMPIValue*>(characters.c_str()), CMPI_chars);
-}
-
-void addReference(CMPIObjectPath* path, const char* name, const CMPIObjectPath* target) {
-    const CMPIValue value = reference(target);
-    add(path, name, &value, CMPI_ref);
+CMPIValue referenceTo(const CMPIObjectPath* target) {
+    CMPIValue value{};
+    value.ref = const_cast<CMPIObjectPath*>(target);
+    return value;
 }
 
 bool samePath(const CMPIObjectPath* left, const CMPIObjectPath* right) {
@@ -216,6 +171,76 @@ bool samePath(const CMPIObjectPath* left, const CMPIObjectPath* right) {
         }
     }
     return true;
+}
+
+LocalObject::LocalObject(std::string itsNameSpace, const Class& itsClass, const Values& values)
+    : nameSpaceCharacters(std::move(itsNameSpace)), className(itsClass.name) {
+    for (const auto& [property, value] : values) {
+        members.emplace_back(*property, value);
+    }
+}
+
+CMPIData LocalObject::dataOf(Member* member, CMPIValueState state, CMPIrc notFound, CMPIStatus* rc) {
+    setStatus(rc, member == nullptr ? notFound : CMPI_RC_OK);
+    if (member == nullptr) {
+        return {CMPI_null, CMPI_notFound | CMPI_nullValue, {}};
+    }
+    CMPIValue value = scalarFrom(member->characters, member->type);
+    if (member->type == CMPI_string) {
+        value.string = member->valueString.handle();
+    }
+    return {member->type, state, value};
+}
+
+CMPIObjectPathFT LocalObject::pathFunctions = [] {
+    CMPIObjectPathFT table{};
+    table.ftVersion = CMPIVersion200;
+    table.getNameSpace = [](const CMPIObjectPath* self, CMPIStatus* rc) {
+        setStatus(rc, CMPI_RC_OK);
+        return of(self).nameSpace.handle();
+    };
+    table.getClassName = [](const CMPIObjectPath* self, CMPIStatus* rc) {
+        setStatus(rc, CMPI_RC_OK);
+        return of(self).className.handle();
+    };
+    table.getKey = [](const CMPIObjectPath* self, const char* name, CMPIStatus* rc) {
+        return dataOf(cim::findNamed(of(self).members, name), CMPI_keyValue, CMPI_RC_ERR_NOT_FOUND, rc);
+    };
+    table.getKeyAt = [](const CMPIObjectPath* self, CMPICount index, CMPIString** name, CMPIStatus* rc) {
+        LocalObject& object = of(self);
+        Member* member = index < object.members.size() ? &object.members[index] : nullptr;
+        if (name != nullptr && member != nullptr) {
+            *name = member->nameString.handle();
+        }
+        return dataOf(member, CMPI_keyValue, CMPI_RC_ERR_NOT_FOUND, rc);
+    };
+    table.getKeyCount = [](const CMPIObjectPath* self, CMPIStatus* rc) {
+        setStatus(rc, CMPI_RC_OK);
+        return static_cast<CMPICount>(of(self).members.size());
+    };
+    return table;
+}();
+
+CMPIInstanceFT LocalObject::instanceFunctions = [] {
+    CMPIInstanceFT table{};
+    table.ftVersion = CMPIVersion200;
+    table.getProperty = [](const CMPIInstance* self, const char* name, CMPIStatus* rc) {
+        return dataOf(cim::findNamed(of(self).members, name), CMPI_goodValue, CMPI_RC_ERR_NO_SUCH_PROPERTY, rc);
+    };
+    return table;
+}();
+
+LocalObject localPath(const CMPIObjectPath* path, const Class& named) {
+    Values keys;
+    for (const Property& property : named) {
+        if (property.isKey) {
+            const auto value = keyOf(path, property);
+            failIf(!value, CMPI_RC_ERR_INVALID_PARAMETER, "The path of a ", named.name, " needs the key ",
+                   property.name, " as a string.");
+            keys.emplace_back(&property, *value);
+        }
+    }
+    return LocalObject(nameSpaceOf(path), named, keys);
 }
 
 }  // namespace gate

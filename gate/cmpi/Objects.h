@@ -2,6 +2,7 @@
 
 #include <cmpift.h>
 
+#include <deque>
 #include <optional>
 #include <string>
 #include <utility>
@@ -11,7 +12,8 @@
 #include "Schema.h"
 #include "cim/CmpiAccess.h"
 
-// Calls of the object manager's functions, and of its paths and instances, which it frees when the request ends.
+// Calls of the object manager's functions, and of its paths and instances, which it frees when the request ends. Paths
+// and instances of the gate itself.
 
 namespace gate {
 
@@ -20,10 +22,14 @@ using cim::make;
 using cim::tell;
 
 /** The characters of a string; empty if any part of it is missing. */
-std::string toString(const CMPIString* string);
+inline std::string toString(const CMPIString* string) {
+    return cim::charactersOf(string).value_or(std::string());
+}
 
 /** Whether a status says that a key or property does not exist. */
-bool isAbsent(const CMPIStatus& status);
+inline bool isAbsent(const CMPIStatus& status) {
+    return status.rc == CMPI_RC_ERR_NOT_FOUND || status.rc == CMPI_RC_ERR_NO_SUCH_PROPERTY;
+}
 
 /** The message that the object manager could not do a task, with its status and its reason if it returned one. */
 std::string managerFailure(const char* task, const CMPIStatus& status);
@@ -91,14 +97,73 @@ CMPIObjectPath* referenceOf(const CMPIObjectPath* path, const char* key);
 /** An integer or boolean as a CMPI value. */
 CMPIValue scalarFrom(const std::string& characters, CMPIType type);
 
-/** @name Setters, which fail if the object manager does */
-///@{
-void setReference(const CMPIInstance* instance, const char* name, const CMPIObjectPath* target);
-void addKey(CMPIObjectPath* path, const char* name, const std::string& characters);
-void addReference(CMPIObjectPath* path, const char* name, const CMPIObjectPath* target);
-///@}
+CMPIValue referenceTo(const CMPIObjectPath* target);
+
+/** Sets a property of an instance. Fails if the object manager does. */
+inline void setProperty(const CMPIInstance* instance, const char* name, const CMPIValue* value, CMPIType type) {
+    requireOk("set a property", tell<&CMPIInstanceFT::setProperty>(instance, name, value, type));
+}
+
+/** Adds a key to a path. Fails if the object manager does. */
+inline void addKey(CMPIObjectPath* path, const char* name, const CMPIValue* value, CMPIType type) {
+    requireOk("add a key", tell<&CMPIObjectPathFT::addKey>(path, name, value, type));
+}
 
 /** Whether two paths have keys and name the same instance. Namespaces are compared where both paths have one. */
 bool samePath(const CMPIObjectPath* left, const CMPIObjectPath* right);
+
+/**
+ * An object path or an instance that the gate makes for the provider, without the object manager. Reading it cannot
+ * fail: if the provider cannot read a key, it uses its first instance. It has only the functions that the provider
+ * calls.
+ */
+class LocalObject {
+public:
+    /** @param values the keys of a path or the properties of an instance */
+    LocalObject(std::string itsNameSpace, const Class& itsClass, const Values& values = {});
+    LocalObject(const LocalObject&) = delete;
+    LocalObject& operator=(const LocalObject&) = delete;
+
+    const CMPIObjectPath* path() const { return &pathHandle; }
+
+    /** The object as an instance, from which properties are read by name. Datetimes are strings. */
+    const CMPIInstance* instance() const { return &instanceHandle; }
+
+private:
+    struct Member {
+        Member(const Property& property, std::string itsValue)
+            : name(property.name),
+              type(property.type == CMPI_dateTime ? CMPIType{CMPI_string} : property.type),
+              characters(std::move(itsValue)) {}
+
+        const char* name;
+        CMPIType type;
+        std::string characters;
+        StaticString nameString{name};
+        StaticString valueString{characters.c_str()};
+    };
+
+    template <class Handle>
+    static LocalObject& of(const Handle* handle) {
+        return *static_cast<LocalObject*>(handle->hdl);
+    }
+
+    static CMPIData dataOf(Member* member, CMPIValueState state, CMPIrc notFound, CMPIStatus* rc);
+    static CMPIObjectPathFT pathFunctions;
+    static CMPIInstanceFT instanceFunctions;
+
+    std::string nameSpaceCharacters;
+    StaticString nameSpace{nameSpaceCharacters.c_str()};
+    StaticString className;
+    std::deque<Member> members{};  ///< whose elements stay where they are
+    CMPIObjectPath pathHandle{this, &pathFunctions};
+    CMPIInstance instanceHandle{this, &instanceFunctions};
+};
+
+/**
+ * The path as the provider expects it: the class's name as in the MOF, its keys and no others. Fails with
+ * CMPI_RC_ERR_INVALID_PARAMETER if a key is missing, since such a path names no instance.
+ */
+LocalObject localPath(const CMPIObjectPath* path, const Class& named);
 
 }  // namespace gate

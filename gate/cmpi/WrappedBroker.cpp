@@ -7,20 +7,6 @@ namespace gate {
 
 namespace {
 
-WrappedBroker& wrapperOf(const CMPIBroker* broker) {
-    return *static_cast<WrappedBroker*>(broker->hdl);
-}
-
-const CMPIBrokerFT& table(const CMPIBroker* broker, const CMPIBrokerFT*) {
-    return *broker->bft;
-}
-const CMPIBrokerEncFT& table(const CMPIBroker* broker, const CMPIBrokerEncFT*) {
-    return *broker->eft;
-}
-const CMPIBrokerMemFT& table(const CMPIBroker* broker, const CMPIBrokerMemFT*) {
-    return *broker->mft;
-}
-
 /** Releases a lock while it exists. Copies its functions, since the wrapper may be replaced meanwhile. */
 class ScopedRelease {
 public:
@@ -33,101 +19,77 @@ private:
     const WrappedBroker::Lock lock;
 };
 
-template <class Object>
-constexpr bool isAnswer = std::is_same_v<Object, CMPIInstance*> || std::is_same_v<Object, CMPIObjectPath*>;
-
-/** Records if a function that creates answers has created none. */
-template <class Object, class... Arguments>
-void recordIfNull(WrappedBroker& wrapper, Object made, Arguments... arguments) {
-    const CMPIStatus* status = std::get<sizeof...(Arguments) - 1>(std::tie(arguments...));
-    if (made == nullptr || (status != nullptr && status->rc != CMPI_RC_OK)) {
-        wrapper.recordFailure();
-    }
-}
-
 /** The function that replaces the one of a slot. */
 template <auto slot>
 struct Forward;
 
 template <class Table, class Result, class... Arguments, Result (*Table::*slot)(const CMPIBroker*, Arguments...)>
 struct Forward<slot> {
+    static constexpr bool makesAnswers =
+        std::is_same_v<Result, CMPIInstance*> || std::is_same_v<Result, CMPIObjectPath*>;
+
     static Result call(const CMPIBroker* broker, Arguments... arguments) {
-        WrappedBroker& wrapper = wrapperOf(broker);
+        auto& wrapper = *static_cast<WrappedBroker*>(broker->hdl);
         const CMPIBroker* manager = wrapper.manager();
-        const auto function = table(manager, static_cast<const Table*>(nullptr)).*slot;
+        const auto function = std::get<Table*>(std::tuple(manager->bft, manager->eft, manager->mft))->*slot;
         if constexpr (std::is_same_v<Table, CMPIBrokerFT>) {
             const ScopedRelease scopedRelease(wrapper.lock());
             return function(manager, arguments...);
-        } else if constexpr (isAnswer<Result>) {
+        } else if constexpr (makesAnswers) {
             const Result made = function(manager, arguments...);
-            recordIfNull(wrapper, made, arguments...);
+            const CMPIStatus* status = std::get<sizeof...(Arguments) - 1>(std::tie(arguments...));
+            wrapper.hasFailed = wrapper.hasFailed || made == nullptr || (status != nullptr && status->rc != CMPI_RC_OK);
             return made;
         } else {
             return function(manager, arguments...);
         }
     }
-
-    static auto in(const Table& original) { return original.*slot != nullptr ? &call : nullptr; }
 };
 
-/** Fills these slots of an empty table. */
+/** A copy of a manager's table in which these slots are replaced, unless they are null. */
 template <auto... slots, class Table>
-void forward(const Table& original, Table& wrapped) {
-    ((wrapped.*slots = Forward<slots>::in(original)), ...);
+Table wrapped(const Table* original) {
+    if (original == nullptr) {
+        return Table{};
+    }
+    Table table = *original;
+    ((table.*slots = original->*slots == nullptr ? nullptr : &Forward<slots>::call), ...);
+    return table;
 }
 
-CMPIBrokerFT wrapped(const CMPIBrokerFT* original) {
-    CMPIBrokerFT services{};
-    if (original == nullptr) {
-        return services;
-    }
-    services.brokerCapabilities = original->brokerCapabilities;
-    services.brokerVersion = original->brokerVersion;
-    services.brokerName = original->brokerName;
+CMPIBrokerFT wrappedServices(const CMPIBrokerFT* original) {
     using T = CMPIBrokerFT;
-    forward<&T::prepareAttachThread, &T::attachThread, &T::detachThread, &T::deliverIndication,
-            &T::enumerateInstanceNames, &T::getInstance, &T::createInstance, &T::modifyInstance, &T::deleteInstance,
-            &T::execQuery, &T::enumerateInstances, &T::associators, &T::associatorNames, &T::references,
-            &T::referenceNames, &T::invokeMethod, &T::setProperty, &T::getProperty>(*original, services);
-    return services;
+    return wrapped<&T::prepareAttachThread, &T::attachThread, &T::detachThread, &T::deliverIndication,
+                   &T::enumerateInstanceNames, &T::getInstance, &T::createInstance, &T::modifyInstance,
+                   &T::deleteInstance, &T::execQuery, &T::enumerateInstances, &T::associators, &T::associatorNames,
+                   &T::references, &T::referenceNames, &T::invokeMethod, &T::setProperty, &T::getProperty>(original);
 }
 
-CMPIBrokerEncFT wrapped(const CMPIBrokerEncFT* original) {
-    CMPIBrokerEncFT encapsulation{};
-    if (original == nullptr) {
-        return encapsulation;
-    }
-    encapsulation.ftVersion = original->ftVersion;
+CMPIBrokerEncFT wrappedEncapsulation(const CMPIBrokerEncFT* original) {
     using T = CMPIBrokerEncFT;
-    forward<&T::newInstance, &T::newObjectPath, &T::newArgs, &T::newString, &T::newArray, &T::newDateTime,
-            &T::newDateTimeFromBinary, &T::newDateTimeFromChars, &T::newSelectExp, &T::classPathIsA, &T::toString,
-            &T::isOfType, &T::getType, &T::logMessage, &T::trace, &T::newCMPIError, &T::openMessageFile,
-            &T::closeMessageFile>(*original, encapsulation);
-    return encapsulation;
+    auto table = wrapped<&T::newInstance, &T::newObjectPath, &T::newArgs, &T::newString, &T::newArray, &T::newDateTime,
+                         &T::newDateTimeFromBinary, &T::newDateTimeFromChars, &T::newSelectExp, &T::classPathIsA,
+                         &T::toString, &T::isOfType, &T::getType, &T::logMessage, &T::trace, &T::newCMPIError,
+                         &T::openMessageFile, &T::closeMessageFile>(original);
+    table.getMessage = nullptr;
+    table.getMessage2 = nullptr;
+    return table;
 }
 
-/** Fills this table at once, in its own order, since its version is a constant. */
-template <auto... slots>
-CMPIBrokerMemFT inOrder(const CMPIBrokerMemFT& original) {
-    return {original.ftVersion, Forward<slots>::in(original)...};
-}
-
-CMPIBrokerMemFT wrapped(const CMPIBrokerMemFT* original) {
+CMPIBrokerMemFT wrappedMemory(const CMPIBrokerMemFT* original) {
     using T = CMPIBrokerMemFT;
-    return original == nullptr
-               ? CMPIBrokerMemFT{}
-               : inOrder<&T::mark, &T::release, &T::cmpiMalloc, &T::cmpiCalloc, &T::cmpiRealloc, &T::cmpiStrDup,
-                         &T::cmpiFree, &T::freeInstance, &T::freeObjectPath, &T::freeArgs, &T::freeString,
-                         &T::freeArray, &T::freeDateTime, &T::freeSelectExp>(*original);
+    return wrapped<&T::mark, &T::release, &T::cmpiMalloc, &T::cmpiCalloc, &T::cmpiRealloc, &T::cmpiStrDup, &T::cmpiFree,
+                   &T::freeInstance, &T::freeObjectPath, &T::freeArgs, &T::freeString, &T::freeArray, &T::freeDateTime,
+                   &T::freeSelectExp>(original);
 }
 
 }  // namespace
 
 WrappedBroker::WrappedBroker(const CMPIBroker* manager, const Lock& lock)
     : callersLock(lock),
-      services(wrapped(manager->bft)),
-      encapsulation(wrapped(manager->eft)),
-      memory(wrapped(manager->mft)),
+      services(wrappedServices(manager->bft)),
+      encapsulation(wrappedEncapsulation(manager->eft)),
+      memory(wrappedMemory(manager->mft)),
       // The thread functions have no broker parameter, so they are not wrapped.
       broker{this, &services, &encapsulation, manager->xft, manager->mft == nullptr ? nullptr : &memory},
       managersOwn(manager) {}

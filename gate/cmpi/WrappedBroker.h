@@ -31,15 +31,8 @@ public:
 
     const Lock& lock() const { return callersLock; }
 
-    /**
-     * @name Whether paths or instances could not be created since forgetFailures()
-     * The provider omits such answers without an error.
-     */
-    ///@{
-    void recordFailure() { failed = true; }
-    void forgetFailures() { failed = false; }
-    bool hasFailed() const { return failed; }
-    ///@}
+    /** Whether a path or instance could not be created. The provider omits such answers without an error. */
+    bool hasFailed = false;
 
 private:
     Lock callersLock;
@@ -48,7 +41,6 @@ private:
     CMPIBrokerMemFT memory;
     CMPIBroker broker;
     const CMPIBroker* managersOwn;
-    bool failed = false;
 };
 
 }  // namespace gate

@@ -9,19 +9,27 @@ namespace gate {
 
 namespace {
 
-/** A computer that the object manager knows. */
-struct Computer {
+/** An object at an end of an association. */
+struct End {
     const CMPIObjectPath* path;
     const CMPIInstance* instance;
 };
 
-using Computers = std::vector<Computer>;
+/** The computers that the object manager knows. */
+using Computers = std::vector<End>;
 
-/** The two ends of an association: a computer and one of its leases or warranties, as a path or as an instance. */
+/** A direction of an association. Without source and target, both. */
+struct Traversal {
+    const Class* association;
+    const Property* source = nullptr;
+    const Property* target = nullptr;
+};
+
+/** A computer and one of its leases or warranties, which is either a path or an instance. */
 struct AssociationPair {
-    Computer computer;
-    const CMPIObjectPath* element;
-    const CMPIInstance* elementInstance;
+    Traversal traversal;
+    End computer;
+    End element;
 };
 
 enum class ElementForm { path, instance };
@@ -38,10 +46,9 @@ void requireEnumerated(bool isDone, const CMPIStatus& status) {
 }
 
 CMPIEnumeration* enumerateComputers(const ClientRequest& request, ProviderSession& session) {
-    const CMPIBroker* broker = session.broker();
-    if (broker->bft == nullptr || broker->bft->enumerateInstances == nullptr) {
-        fail(CMPI_RC_ERR_FAILED, "The object manager cannot enumerate computers.");
-    }
+    const CMPIBroker* broker = request.broker();
+    failIf(broker->bft == nullptr || broker->bft->enumerateInstances == nullptr, CMPI_RC_ERR_FAILED,
+           "The object manager cannot enumerate computers.");
     const CMPIObjectPath* classPath = makePath(broker, nameSpaceOf(request.path), computerClass);
     CMPIStatus status{CMPI_RC_OK, nullptr};
     CMPIEnumeration* computers = nullptr;
@@ -67,10 +74,9 @@ const CMPIObjectPath* computerPathOf(const ClientRequest& request, const CMPIBro
     const CMPICount count = keyCountOf(given);
     for (CMPICount index = 0; index < count; ++index) {
         CMPIString* keyName = nullptr;
-        const auto data = ask<&CMPIObjectPathFT::getKeyAt>(given, index, &keyName);
-        requireOk("name a computer", data.status);
+        const CMPIData key = demand<&CMPIObjectPathFT::getKeyAt>("name a computer", given, index, &keyName);
         requireOk("name a computer",
-                  tell<&CMPIObjectPathFT::addKey>(path, toString(keyName).c_str(), &data.value.value, data.value.type));
+                  tell<&CMPIObjectPathFT::addKey>(path, toString(keyName).c_str(), &key.value, key.type));
     }
     return path;
 }
@@ -83,13 +89,13 @@ Computers knownComputers(const ClientRequest& request, ProviderSession& session)
         const auto next = ask<&CMPIEnumerationFT::getNext>(enumeration);
         CMPIInstance* instance = next.isOk() ? cim::elementInstance(next.value) : nullptr;
         requireEnumerated(instance != nullptr, next.status);
-        const CMPIObjectPath* path = computerPathOf(request, session.broker(), instance);
+        const CMPIObjectPath* path = computerPathOf(request, request.broker(), instance);
         if (nameSpaceOf(pathOf(instance)).empty()) {
             // Makes the instance's path complete, too, if the manager can.
             tell<&CMPIInstanceFT::setObjectPath>(instance, path);
         }
-        const bool isKnown = std::any_of(computers.begin(), computers.end(),
-                                         [&](const Computer& each) { return samePath(each.path, path); });
+        const bool isKnown =
+            std::any_of(computers.begin(), computers.end(), [&](const End& each) { return samePath(each.path, path); });
         if (!isKnown) {
             computers.push_back({path, instance});
         }
@@ -99,24 +105,24 @@ Computers knownComputers(const ClientRequest& request, ProviderSession& session)
 
 /** The computer with the path, or none. */
 Computers computerAt(const CMPIObjectPath* path, Computers computers) {
-    const auto isOther = [&](const Computer& each) { return !samePath(each.path, path); };
+    const auto isOther = [&](const End& each) { return !samePath(each.path, path); };
     computers.erase(std::remove_if(computers.begin(), computers.end(), isOther), computers.end());
     return computers;
 }
 
 /** The pairs of an association, in the order of the computers. The provider knows the elements of each. */
-Pairs pairsOf(const ProviderSession& session, const Computers& computers, const Class& association,
+Pairs pairsOf(const ProviderSession& session, const Computers& computers, const Traversal& traversal,
               ElementForm form = ElementForm::path) {
     Pairs pairs;
-    for (const Computer& computer : computers) {
+    for (const End& computer : computers) {
         const LocalObject keys = localPath(computer.path, *findClass(computerClass));
         if (form == ElementForm::instance) {
-            for (const CMPIInstance* instance : session.associators(keys, association)) {
-                pairs.push_back({computer, nullptr, instance});
+            for (const CMPIInstance* instance : session.associators(keys, *traversal.association)) {
+                pairs.push_back({traversal, computer, {nullptr, instance}});
             }
         } else {
-            for (const CMPIObjectPath* path : session.associatorNames(keys, association)) {
-                pairs.push_back({computer, path, nullptr});
+            for (const CMPIObjectPath* path : session.associatorNames(keys, *traversal.association)) {
+                pairs.push_back({traversal, computer, {path, nullptr}});
             }
         }
     }
@@ -140,28 +146,16 @@ bool isA(const ClientRequest& request, const CMPIObjectPath* path, const char* c
     }
     // No class of the MOF is a subclass of another.
     const bool areBothKnown = findClass(pathsClass) != nullptr && findClass(className) != nullptr;
-    if (areBothKnown || broker->eft == nullptr || broker->eft->classPathIsA == nullptr) {
-        return false;
-    }
-    CMPIStatus status{CMPI_RC_OK, nullptr};
-    const bool answer = broker->eft->classPathIsA(broker, path, className, &status) != 0;
-    return answer && status.rc == CMPI_RC_OK;
+    return !areBothKnown && make<&CMPIBrokerEncFT::classPathIsA>(broker, path, className) != 0;
 }
 
 bool isComputerEnd(const Property& end) {
     return sameName(end.referenceClass, computerClass);
 }
 
-const CMPIObjectPath* pathAt(const Property& end, const AssociationPair& pair) {
-    return isComputerEnd(end) ? pair.computer.path : pair.element;
+const End& at(const Property& end, const AssociationPair& pair) {
+    return isComputerEnd(end) ? pair.computer : pair.element;
 }
-
-/** A direction of an association. */
-struct Traversal {
-    const Class* association;
-    const Property* source;
-    const Property* target;
-};
 
 /**
  * A client's restriction. Names ignore letter case; null and the empty string mean any. The role is the property of the
@@ -193,14 +187,13 @@ std::vector<Traversal> traversalsFrom(const ClientRequest& request, const Traver
 }
 
 /**
- * Returns what `visit(traversal, pair)` returns for each pair at the request's path, in one session.
+ * Returns what `make(request, pair)` makes of each pair at the request's path, in one session.
  * @param form of the elements at the targets of the traversals
  */
-template <class Answers, class Visit>
-Answers traverse(const ClientRequest& request, const TraversalFilter& filter, ElementForm form, Visit visit) {
-    if (keyCountOf(request.path) == 0) {
-        fail(CMPI_RC_ERR_INVALID_PARAMETER, "Associations begin at an instance: the path needs its keys.");
-    }
+template <class Answers, class Make>
+Answers traverse(const ClientRequest& request, const TraversalFilter& filter, ElementForm form, Make make) {
+    failIf(keyCountOf(request.path) == 0, CMPI_RC_ERR_INVALID_PARAMETER,
+           "Associations begin at an instance: the path needs its keys.");
     Answers answers;
     const std::vector<Traversal> traversals = traversalsFrom(request, filter);
     if (traversals.empty()) {
@@ -210,12 +203,11 @@ Answers traverse(const ClientRequest& request, const TraversalFilter& filter, El
     const Computers computers = knownComputers(request, session);
     for (const Traversal& traversal : traversals) {
         const bool isFromComputer = isComputerEnd(*traversal.source);
-        const Pairs pairs = isFromComputer
-                                ? pairsOf(session, computerAt(request.path, computers), *traversal.association, form)
-                                : pairsOf(session, computers, *traversal.association);
+        const Pairs pairs = isFromComputer ? pairsOf(session, computerAt(request.path, computers), traversal, form)
+                                           : pairsOf(session, computers, traversal);
         for (const AssociationPair& pair : pairs) {
-            if (isFromComputer || samePath(pair.element, request.path)) {
-                answers.push_back(visit(traversal, pair));
+            if (isFromComputer || samePath(pair.element.path, request.path)) {
+                answers.push_back(make(request, pair));
             }
         }
     }
@@ -232,21 +224,22 @@ void giveOfClass(const ClientRequest& request, const char* resultClass, Answers 
     request.give(answers);
 }
 
-const CMPIObjectPath* associationPath(const ClientRequest& request, const Class& association,
-                                      const AssociationPair& pair) {
+const CMPIObjectPath* associationPath(const ClientRequest& request, const AssociationPair& pair) {
+    const Class& association = *pair.traversal.association;
     CMPIObjectPath* path = makePath(request.broker(), nameSpaceOf(request.path), association.name);
     for (const Property& end : association) {
-        addReference(path, end.name, pathAt(end, pair));
+        const CMPIValue target = referenceTo(at(end, pair).path);
+        addKey(path, end.name, &target, CMPI_ref);
     }
     return path;
 }
 
 /** The instance of an association. Both of its properties are keys, so a property list does not restrict it. */
-const CMPIInstance* associationInstance(const ClientRequest& request, const Class& association,
-                                        const AssociationPair& pair) {
-    CMPIInstance* instance = makeInstance(request.broker(), associationPath(request, association, pair));
-    for (const Property& end : association) {
-        setReference(instance, end.name, pathAt(end, pair));
+const CMPIInstance* associationInstance(const ClientRequest& request, const AssociationPair& pair) {
+    CMPIInstance* instance = makeInstance(request.broker(), associationPath(request, pair));
+    for (const Property& end : *pair.traversal.association) {
+        const CMPIValue target = referenceTo(at(end, pair).path);
+        setProperty(instance, end.name, &target, CMPI_ref);
     }
     return instance;
 }
@@ -256,29 +249,20 @@ template <class Answers, class Make>
 Answers allOf(const ClientRequest& request, const Class& association, Make make) {
     ProviderSession session(request);
     Answers answers;
-    for (const AssociationPair& pair : pairsOf(session, knownComputers(request, session), association)) {
-        answers.push_back(make(request, association, pair));
+    for (const AssociationPair& pair : pairsOf(session, knownComputers(request, session), {&association})) {
+        answers.push_back(make(request, pair));
     }
     return answers;
-}
-
-/** Returns what `make` makes of the pairs of all associations at the request's path. */
-template <class Answers, class Make>
-Answers referencesFrom(const ClientRequest& request, const char* associationClass, const char* role, Make make) {
-    return traverse<Answers>(request, {associationClass, role, nullptr}, ElementForm::path,
-                             [&](const Traversal& traversal, const AssociationPair& pair) {
-                                 return make(request, *traversal.association, pair);
-                             });
 }
 
 }  // namespace
 
 void associators(const ClientRequest& request, const char* associationClass, const char* resultClass, const char* role,
                  const char* resultRole, const char** properties) {
-    const auto instanceAt = [&](const Traversal& traversal, const AssociationPair& pair) {
-        const PropertySelection selection(properties, *findClass(traversal.target->referenceClass));
-        return selection.applied(request.broker(),
-                                 isComputerEnd(*traversal.target) ? pair.computer.instance : pair.elementInstance);
+    const auto instanceAt = [&](const ClientRequest&, const AssociationPair& pair) {
+        const Property& target = *pair.traversal.target;
+        const PropertySelection selection(properties, *findClass(target.referenceClass));
+        return selection.applied(request.broker(), at(target, pair).instance);
     };
     giveOfClass(request, resultClass,
                 traverse<Instances>(request, {associationClass, role, resultRole}, ElementForm::instance, instanceAt),
@@ -287,8 +271,8 @@ void associators(const ClientRequest& request, const char* associationClass, con
 
 void associatorNames(const ClientRequest& request, const char* associationClass, const char* resultClass,
                      const char* role, const char* resultRole) {
-    const auto targetOf = [](const Traversal& traversal, const AssociationPair& pair) {
-        return pathAt(*traversal.target, pair);
+    const auto targetOf = [](const ClientRequest&, const AssociationPair& pair) {
+        return at(*pair.traversal.target, pair).path;
     };
     giveOfClass(request, resultClass,
                 traverse<Paths>(request, {associationClass, role, resultRole}, ElementForm::path, targetOf),
@@ -296,11 +280,12 @@ void associatorNames(const ClientRequest& request, const char* associationClass,
 }
 
 void references(const ClientRequest& request, const char* associationClass, const char* role, const char**) {
-    request.give(referencesFrom<Instances>(request, associationClass, role, associationInstance));
+    request.give(
+        traverse<Instances>(request, {associationClass, role, nullptr}, ElementForm::path, associationInstance));
 }
 
 void referenceNames(const ClientRequest& request, const char* associationClass, const char* role) {
-    request.give(referencesFrom<Paths>(request, associationClass, role, associationPath));
+    request.give(traverse<Paths>(request, {associationClass, role, nullptr}, ElementForm::path, associationPath));
 }
 
 Instances associationInstances(const ClientRequest& request, const Class& association) {
@@ -316,19 +301,17 @@ const CMPIInstance* associationAt(const ClientRequest& request, const Class& ass
     const CMPIObjectPath* computer = nullptr;
     for (const Property& end : association) {
         const CMPIObjectPath* target = referenceOf(request.path, end.name);
-        if (target == nullptr) {
-            fail(CMPI_RC_ERR_INVALID_PARAMETER,
-                 std::string("The path of a ") + association.name + " needs the key " + end.name + " as a reference.");
-        }
+        failIf(target == nullptr, CMPI_RC_ERR_INVALID_PARAMETER, "The path of a ", association.name, " needs the key ",
+               end.name, " as a reference.");
         computer = isComputerEnd(end) ? target : computer;
     }
-    for (const AssociationPair& pair :
-         pairsOf(session, computerAt(computer, knownComputers(request, session)), association)) {
-        if (samePath(associationPath(request, association, pair), request.path)) {
-            return associationInstance(request, association, pair);
+    const Computers computers = computerAt(computer, knownComputers(request, session));
+    for (const AssociationPair& pair : pairsOf(session, computers, {&association})) {
+        if (samePath(associationPath(request, pair), request.path)) {
+            return associationInstance(request, pair);
         }
     }
-    fail(CMPI_RC_ERR_NOT_FOUND, std::string("There is no such ") + association.name + ".");
+    fail(CMPI_RC_ERR_NOT_FOUND, "There is no such ", association.name, ".");
 }
 
 }  // namespace gate

@@ -11,9 +11,8 @@ namespace {
  */
 const DataFile& fileOf(const Class& owner, bool hasRecords, const char* changed) {
     const DataFile* file = dataFileOf(owner);
-    if (file == nullptr || (hasRecords && !file->hasRecords)) {
-        fail(CMPI_RC_ERR_NOT_SUPPORTED, std::string("Instances of ") + owner.name + changed);
-    }
+    failIf(file == nullptr || (hasRecords && !file->hasRecords), CMPI_RC_ERR_NOT_SUPPORTED, "Instances of ", owner.name,
+           changed);
     return *file;
 }
 
@@ -22,9 +21,7 @@ const DataFile& recordFileOf(const Class& owner) {
 }
 
 void requireInstance(const CMPIInstance* instance) {
-    if (instance == nullptr) {
-        fail(CMPI_RC_ERR_INVALID_PARAMETER, "The request has no instance.");
-    }
+    failIf(instance == nullptr, CMPI_RC_ERR_INVALID_PARAMETER, "The request has no instance.");
 }
 
 void requireKnownProperties(const Class& owner, const CMPIInstance* instance) {
@@ -34,9 +31,8 @@ void requireKnownProperties(const Class& owner, const CMPIInstance* instance) {
         ask<&CMPIInstanceFT::getPropertyAt>(instance, index, &nameString);
         const std::string name = toString(nameString);
         require(!name.empty(), "name a property of the instance");
-        if (cim::findNamed(owner, name) == nullptr) {
-            fail(CMPI_RC_ERR_NO_SUCH_PROPERTY, std::string(owner.name) + " has no property " + name + ".");
-        }
+        failIf(cim::findNamed(owner, name) == nullptr, CMPI_RC_ERR_NO_SUCH_PROPERTY, owner.name, " has no property ",
+               name, ".");
     }
 }
 
@@ -45,10 +41,8 @@ std::string identifierOf(const CMPIObjectPath* path, const CMPIInstance* instanc
                          const Class& owner) {
     std::string fromPath = keyOf(path, key).value_or(std::string());
     std::string fromInstance = propertyOf(instance, key).value_or(std::string());
-    if (fromPath.empty() && fromInstance.empty()) {
-        fail(CMPI_RC_ERR_INVALID_PARAMETER, std::string("A new ") + owner.name + " needs a value of its key " +
-                                                key.name + ", in the path or in the instance.");
-    }
+    failIf(fromPath.empty() && fromInstance.empty(), CMPI_RC_ERR_INVALID_PARAMETER, "A new ", owner.name,
+           " needs a value of its key ", key.name, ", in the path or in the instance.");
     return fromPath.empty() ? fromInstance : fromPath;
 }
 
@@ -64,8 +58,9 @@ void createInstance(const ClientRequest& request, const CMPIInstance* instance) 
     requireKnownProperties(requested, instance);
     const Values given = valuesOf(instance, requested, [](const Property& property) { return !property.isKey; });
     const std::string nameSpace = nameSpaceOf(request.path);
-    CMPIObjectPath* created = makePath(session.broker(), nameSpace, requested.name);
-    addKey(created, key.name, identifier);
+    CMPIObjectPath* created = makePath(request.broker(), nameSpace, requested.name);
+    // In CMPI, the pointer to a value of type CMPI_chars is the pointer to its characters.
+    addKey(created, key.name, reinterpret_cast<const CMPIValue*>(identifier.c_str()), CMPI_chars);
     const Paths answer{created};
     const LocalObject path(nameSpace, requested, {{&key, identifier}});
     Transaction(session, requested, file, path).create(identifier, given, [&] { request.give(answer); });
@@ -82,7 +77,7 @@ void modifyInstance(const ClientRequest& request, const CMPIInstance* instance, 
     requireKnownProperties(requested, instance);
     const Values given = valuesOf(instance, requested, [&](const Property& each) { return selection.has(each); });
     const CMPIInstance* current = session.get(path, requested);
-    const Values changes = diff(current, given, selection.isListed());
+    const Values changes = diff(current, given, properties != nullptr);
     if (!changes.empty()) {
         Transaction(session, requested, file, path).modify(current, changes);
     }

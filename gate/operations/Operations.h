@@ -1,13 +1,37 @@
 #pragma once
 
-#include "PropertySelection.h"
+#include <vector>
 
-// The operations of CIM. Each returns its answers through the request's result, or throws Failure or ManagerGone.
+#include "gate/session/ProviderSession.h"
+
+// The operations of CIM, and their property lists. Each returns its answers through the request's result, or throws
+// Failure or ManagerGone.
 //
 // An operation begins its session before it reads a client's keys and values, and returns its answers after the
 // session, so that a slow client does not block others. Only a creation returns its path within the session.
 
 namespace gate {
+
+/** The properties of a class that a client asks for or sends; without a list, all. Names ignore letter case. */
+class PropertySelection {
+public:
+    /** @param list names, ended by a null pointer; null for none */
+    PropertySelection(const char** list, const Class& itsClass);
+
+    bool has(const Property& property) const;
+
+    /** Fails with CMPI_RC_ERR_NO_SUCH_PROPERTY if a name on the list is not a property of the class. */
+    void requireKnown() const;
+
+    /** The instance with its keys and the selected properties: itself, or a new one if some are not selected. */
+    const CMPIInstance* applied(const CMPIBroker* broker, const CMPIInstance* instance) const;
+
+private:
+    const Class& owner;
+    bool hasList;
+    std::vector<const char*> names{};
+    bool isComplete;  ///< whether it has all properties of the class
+};
 
 void enumerateInstanceNames(const ClientRequest& request);
 void enumerateInstances(const ClientRequest& request, const char** properties);

@@ -1,6 +1,56 @@
+#include <algorithm>
+
 #include "Operations.h"
 
 namespace gate {
+
+PropertySelection::PropertySelection(const char** list, const Class& itsClass)
+    : owner(itsClass), hasList(list != nullptr) {
+    for (const char** name = list; hasList && *name != nullptr; ++name) {
+        names.push_back(*name);
+    }
+    isComplete = std::all_of(owner.begin(), owner.end(), [&](const Property& property) { return has(property); });
+}
+
+bool PropertySelection::has(const Property& property) const {
+    return !hasList ||
+           std::any_of(names.begin(), names.end(), [&](const char* name) { return sameName(name, property.name); });
+}
+
+void PropertySelection::requireKnown() const {
+    for (const char* name : names) {
+        failIf(cim::findNamed(owner, name) == nullptr, CMPI_RC_ERR_NO_SUCH_PROPERTY, owner.name, " has no property ",
+               name, ".");
+    }
+}
+
+const CMPIInstance* PropertySelection::applied(const CMPIBroker* broker, const CMPIInstance* instance) const {
+    if (isComplete) {
+        return instance;
+    }
+    CMPIInstance* made = makeInstance(broker, pathOf(instance));
+    // Some managers put all properties of the class into a new instance; the filter removes them. The keys are listed,
+    // too, since some managers hide properties that are only named as keys.
+    std::vector<const char*> keys;
+    for (const Property& property : owner) {
+        keys.insert(keys.end(), property.isKey ? 1 : 0, property.name);
+    }
+    std::vector<const char*> shown = keys;
+    shown.insert(shown.end(), names.begin(), names.end());
+    keys.push_back(nullptr);
+    shown.push_back(nullptr);
+    tell<&CMPIInstanceFT::setPropertyFilter>(made, shown.data(), keys.data());
+    for (const Property& property : owner) {
+        const auto answer = ask<&CMPIInstanceFT::getProperty>(instance, property.name);
+        require(answer.isOk() || isAbsent(answer.status), "return the value of a property", answer.status);
+        const bool isPresent = answer.isOk() && (answer.value.state & (CMPI_notFound | CMPI_badValue)) == 0;
+        if (isPresent && (property.isKey || has(property))) {
+            const CMPIValue* value = cim::hasValue(answer.value) ? &answer.value.value : nullptr;
+            setProperty(made, property.name, value, answer.value.type);
+        }
+    }
+    return made;
+}
 
 namespace {
 
@@ -15,7 +65,7 @@ Instances instancesOf(const ClientRequest& request, const Class& requested, cons
     const PropertySelection selection(properties, requested);
     Instances instances = session.instances(requested);
     for (const CMPIInstance*& instance : instances) {
-        instance = selection.applied(session.broker(), instance);
+        instance = selection.applied(request.broker(), instance);
     }
     return instances;
 }
@@ -23,7 +73,7 @@ Instances instancesOf(const ClientRequest& request, const Class& requested, cons
 const CMPIInstance* instanceAt(const ClientRequest& request, const Class& requested, const char** properties) {
     const ProviderSession session(request);
     const CMPIInstance* instance = session.get(localPath(request.path, requested), requested);
-    return PropertySelection(properties, requested).applied(session.broker(), instance);
+    return PropertySelection(properties, requested).applied(request.broker(), instance);
 }
 
 }  // namespace

@@ -3,7 +3,6 @@
 #include <cxxabi.h>
 #include <dlfcn.h>
 
-#include <algorithm>
 #include <chrono>
 #include <exception>
 #include <thread>
@@ -28,9 +27,6 @@ constexpr std::chrono::milliseconds pollInterval{10};
 /** How long a request waits for newer records if it may use older ones. A file's time has a resolution of 10 ms. */
 constexpr std::chrono::milliseconds newerTimeout{50};
 
-/** The classes of the record files, in their order. */
-constexpr std::array<const char*, durable::recordFileCount> recordClasses{"VELKO_Lease", "VELKO_Warranty"};
-
 /** Releases the lock while the condition holds, but not much longer than the timeout. */
 template <class Condition>
 void waitWhile(LockGuard& guard, std::chrono::milliseconds timeout, Condition condition) {
@@ -47,16 +43,6 @@ void stayLoaded() {
         dlopen(self.dli_fname, RTLD_LAZY | RTLD_NOLOAD | RTLD_NODELETE);  // not closed, which would end its effect
     }
 }
-
-/** The agent's data directory. */
-durable::DataDirectory theDirectory{[] { return std::string(KO::PlatformUtilities::getKelsaDataDir()); },
-                                    [](const std::string& message) { logError(message); }};
-
-}  // namespace
-
-ProviderConnection theConnection;
-
-namespace {
 
 /** Shuts down when this library is unloaded and when the process ends. */
 class ShutdownAtExit {
@@ -82,9 +68,15 @@ private:
     bool isRegistering = false;
 };
 
-ShutdownAtExit shutdownAtExit;  // destroyed before the objects above
+/** The agent's data directory. */
+durable::DataDirectory theDirectory{[] { return std::string(KO::PlatformUtilities::getKelsaDataDir()); },
+                                    [](const std::string& message) { logError(message); }};
 
 }  // namespace
+
+ProviderConnection theConnection;
+
+static ShutdownAtExit shutdownAtExit;  // destroyed before the objects above
 
 void ProviderConnection::connect(const CMPIBroker* manager) {
     const bool isOpen = theRequestLock.open();
@@ -124,9 +116,7 @@ void ProviderConnection::requireOwner(LockGuard& guard) {
         ownership = theDirectory.acquire();
         return ownership.isOtherProcess;
     });
-    if (!ownership.isOwner) {
-        fail(CMPI_RC_ERR_FAILED, ownership.reason);
-    }
+    failIf(!ownership.isOwner, CMPI_RC_ERR_FAILED, ownership.reason);
 }
 
 void ProviderConnection::requireCurrent(LockGuard& guard, bool mayBeOlder) {
@@ -136,18 +126,13 @@ void ProviderConnection::requireCurrent(LockGuard& guard, bool mayBeOlder) {
         return isWaiting = needsLoading && (upCalls != 0 || !load());
     };
     waitWhile(guard, newerTimeout, update);
-    if (isWaiting && mayBeOlder && library.isLoaded() && !isOutdated) {
-        return;
-    }
-    if (isWaiting) {
+    const bool mayUseOlder = mayBeOlder && library.isLoaded() && !isOutdated;
+    if (isWaiting && !mayUseOlder) {
         waitWhile(guard, waitTimeout, update);
     }
-    if (isWaiting && upCalls != 0) {
-        fail(CMPI_RC_ERR_FAILED, "The provider waits for the object manager and cannot be loaded again. Try again.");
-    }
-    if (isWaiting) {
-        fail(CMPI_RC_ERR_FAILED, "The record files are incomplete, or another process is writing them. Try again.");
-    }
+    failIf(isWaiting && !mayUseOlder, CMPI_RC_ERR_FAILED,
+           upCalls != 0 ? "The provider waits for the object manager and cannot be loaded again. Try again."
+                        : "The record files are incomplete, or another process is writing them. Try again.");
 }
 
 /**
@@ -155,9 +140,8 @@ void ProviderConnection::requireCurrent(LockGuard& guard, bool mayBeOlder) {
  * whether the files are complete and did not change during the call.
  */
 bool ProviderConnection::load() {
-    if (theDirectory.hasLostFiles()) {
-        fail(CMPI_RC_ERR_FAILED, "The record files were removed. Restore the data directory and try again.");
-    }
+    failIf(theDirectory.hasLostFiles(), CMPI_RC_ERR_FAILED,
+           "The record files were removed. Restore the data directory and try again.");
     if (!theDirectory.open()) {
         return false;  // a request may read the older tables
     }
@@ -169,46 +153,39 @@ bool ProviderConnection::load() {
     if (!theDirectory.hasChanged()) {
         createInterfaces();
         isOutdated = false;
-        verified = 0;
-        read = 0;
+        for (Table& table : tables) {
+            table = {table.name};
+        }
     }
     return !isOutdated;
 }
 
-bool ProviderConnection::hasRead(const Class& owner, std::optional<std::size_t> count) {
-    const auto* const found = std::find_if(recordClasses.begin(), recordClasses.end(),
-                                           [&](const char* name) { return sameName(name, owner.name); });
-    if (found == recordClasses.end() || (read & bitOf(owner)) != 0) {
-        return true;
+void ProviderConnection::requireRead(const Class& owner, std::size_t count) {
+    Table* const table = tableOf(owner);
+    if (table == nullptr || table->isRead) {
+        return;
     }
-    if (!count) {
-        return false;
-    }
-    const auto index = static_cast<std::size_t>(found - recordClasses.begin());
+    const auto index = static_cast<std::size_t>(table - tables.data());
     if (!counts[index]) {  // the gate could not read the file, but the provider may have
         counts[index] = theDirectory.recordCounts()[index];
     }
     if (count != counts[index]) {
         setOutdated();
-        fail(CMPI_RC_ERR_FAILED, std::string("The provider could not read the records of ") + owner.name +
-                                     "; see the agent's log at level 3000. It reads them again; repeat the request.");
+        fail(CMPI_RC_ERR_FAILED, "The provider could not read the records of ", owner.name,
+             "; see the agent's log at level 3000. It reads them again; repeat the request.");
     }
-    read |= bitOf(owner);
-    return true;
+    table->isRead = true;
 }
 
 void ProviderConnection::unload() {
-    instances = nullptr;
-    associations = nullptr;
+    providers = {};
     library.unload();
 }
 
 void ProviderConnection::createInterfaces() {
-    instances = library.createInstanceMI(wrapped->handle());
-    associations = library.createAssociationMI(wrapped->handle());
-    if (instances == nullptr || associations == nullptr) {
-        fail(CMPI_RC_ERR_FAILED, "The provider did not return its interfaces.");
-    }
+    providers = library.createInterfaces(wrapped->handle());
+    failIf(providers.instances == nullptr || providers.associations == nullptr, CMPI_RC_ERR_FAILED,
+           "The provider did not return its interfaces.");
 }
 
 const CMPIBroker* ProviderConnection::broker() const {
@@ -219,8 +196,14 @@ const CMPIBroker* ProviderConnection::broker() const {
 void ProviderConnection::shutdown(const CMPIContext* context) {
     std::exception_ptr failure;
     theRequestLock.close(drainTimeout, RequestLock::Closing::temporary, [&] {
+        const auto [instances, associations] = providers;
         try {
-            endProvider(context);
+            if (broker() != nullptr && instances != nullptr && associations != nullptr) {
+                instances->ft->cleanup(instances, context, 1);
+                associations->ft->cleanup(associations, context, 1);
+            }
+            set(nullptr);
+            endProcess();
         } catch (...) {
             failure = std::current_exception();
         }
@@ -235,23 +218,14 @@ void ProviderConnection::shutdown(const CMPIContext* context) {
 
 bool ProviderConnection::isConnectedTo(const CMPIBroker* manager) const {
     const std::lock_guard<std::mutex> lock(mutex);
-    return managersOwn == manager && tables.bft == manager->bft && tables.eft == manager->eft &&
-           tables.xft == manager->xft && tables.mft == manager->mft;
+    return managersOwn == manager && brokersTables.bft == manager->bft && brokersTables.eft == manager->eft &&
+           brokersTables.xft == manager->xft && brokersTables.mft == manager->mft;
 }
 
 void ProviderConnection::set(const CMPIBroker* manager) {
     const std::lock_guard<std::mutex> lock(mutex);
     managersOwn = manager;
-    tables = manager == nullptr ? CMPIBroker{} : *manager;
-}
-
-void ProviderConnection::endProvider(const CMPIContext* context) {
-    if (broker() != nullptr && instances != nullptr && associations != nullptr) {
-        instances->ft->cleanup(instances, context, 1);
-        associations->ft->cleanup(associations, context, 1);
-    }
-    set(nullptr);
-    endProcess();
+    brokersTables = manager == nullptr ? CMPIBroker{} : *manager;
 }
 
 void ProviderConnection::endProcess() {

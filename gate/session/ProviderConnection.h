@@ -5,7 +5,6 @@
 #include <mutex>
 #include <optional>
 
-#include "ProviderLibrary.h"
 #include "RequestLock.h"
 #include "durable/RecordFile.h"
 #include "gate/cmpi/Schema.h"
@@ -13,12 +12,47 @@
 
 namespace gate {
 
+/** The provider's interfaces. Null if it has returned none. */
+struct ProviderInterfaces {
+    CMPIInstanceMI* instances = nullptr;
+    CMPIAssociationMI* associations = nullptr;
+};
+
+/**
+ * The provider's shared library, in the directory of this one. It is not linked: the provider reads its record files
+ * when it is loaded, so they must be recovered first. If it is loaded again, it reads them again.
+ */
+class ProviderLibrary {
+public:
+    bool isLoaded() const { return handle != nullptr; }
+
+    /**
+     * Loads the library. Throws std::runtime_error with the reason, also if another part of the process has loaded it:
+     * the provider would not read its files again.
+     */
+    void load();
+
+    /** Unloads the library if it is loaded. */
+    void unload();
+
+    /** Calls the factories, while it is loaded. */
+    ProviderInterfaces createInterfaces(const CMPIBroker* broker) const;
+
+private:
+    void* handle = nullptr;
+};
+
 /** The process's only connection between the provider and an object manager. Loads and unloads the provider. */
 class ProviderConnection {
 public:
+    /** The provider's table of a record file. */
+    struct Table {
+        const char* name;         ///< of the class
+        bool isRead = false;      ///< whether it is known that the provider has read the file
+        bool isVerified = false;  ///< whether it has been compared with the file since the provider was loaded
+    };
+
     constexpr ProviderConnection() = default;
-    ProviderConnection(const ProviderConnection&) = delete;
-    ProviderConnection& operator=(const ProviderConnection&) = delete;
 
     /**
      * Connects the provider to a broker, which then serves all requests. Opens the request lock if it was
@@ -40,8 +74,7 @@ public:
     /** @name Callable with the request lock held, while there is a broker */
     ///@{
     WrappedBroker& wrappedBroker() { return *wrapped; }
-    CMPIInstanceMI* instanceInterface() const { return instances; }
-    CMPIAssociationMI* associationInterface() const { return associations; }
+    const ProviderInterfaces& interfaces() const { return providers; }
 
     /**
      * Ensures that this process owns the data directory, for a change. Releases the lock until another owner ends.
@@ -60,42 +93,33 @@ public:
      */
     void requireCurrent(LockGuard& guard, bool mayBeOlder);
 
-    /** @name Whether a class's table has been compared with its file since the provider was loaded */
-    bool isVerified(const Class& owner) const { return (verified & bitOf(owner)) != 0; }
-    void setVerified(const Class& owner) { verified |= bitOf(owner); }
+    /** The provider's table of a class; null if the class has no record file. */
+    Table* tableOf(const Class& owner) { return cim::findNamed(tables, owner.name); }
 
     /**
-     * Whether the provider has read the record file of a class, or the class has none. The provider does not report
-     * that it could not read. So its records are counted once: fails with CMPI_RC_ERR_FAILED unless they are as many as
-     * the file had when the provider was loaded.
-     * @param count the number of the provider's records; none if they are not counted yet
-     * @return false if they have to be counted
+     * Fails with CMPI_RC_ERR_FAILED unless the provider has as many records of a class as the file had when the
+     * provider was loaded: it does not report that it could not read. Only the first call compares them.
      */
-    bool hasRead(const Class& owner, std::optional<std::size_t> count);
+    void requireRead(const Class& owner, std::size_t count);
     ///@}
 
 private:
-    static std::size_t bitOf(const Class& owner) { return std::size_t{1} << (&owner - Classes().begin()); }
-
     bool load();
     void unload();
     void createInterfaces();
     bool isConnectedTo(const CMPIBroker* manager) const;
     void set(const CMPIBroker* manager);
-    void endProvider(const CMPIContext* context);
 
     ProviderLibrary library{};
     bool isOutdated = false;
-    std::size_t verified = 0;                                                   ///< a bit of each class
-    std::size_t read = 0;                                                       ///< the same
+    std::array<Table, durable::recordFileCount> tables{Table{"VELKO_Lease"}, Table{"VELKO_Warranty"}};  ///< by file
     std::array<std::optional<std::size_t>, durable::recordFileCount> counts{};  ///< when the provider was loaded
     std::size_t upCalls = 0;  ///< requests in the provider that have released the lock
     std::optional<WrappedBroker> wrapped{};
-    CMPIInstanceMI* instances = nullptr;
-    CMPIAssociationMI* associations = nullptr;
+    ProviderInterfaces providers{};
     mutable std::mutex mutex{};  ///< of the members below, for callers without the request lock
     const CMPIBroker* managersOwn = nullptr;
-    CMPIBroker tables{};  ///< a copy of the broker, made when the provider was connected
+    CMPIBroker brokersTables{};  ///< a copy of the broker, made when the provider was connected
 };
 
 extern ProviderConnection theConnection;

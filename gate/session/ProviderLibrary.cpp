@@ -1,9 +1,9 @@
-#include "ProviderLibrary.h"
-
 #include <dlfcn.h>
 
 #include <stdexcept>
 #include <string>
+
+#include "ProviderConnection.h"
 
 namespace gate {
 
@@ -49,12 +49,9 @@ void ProviderLibrary::unload() {
     }
 }
 
-CMPIInstanceMI* ProviderLibrary::createInstanceMI(const CMPIBroker* broker) const {
-    return callFactory<CMPIInstanceMI>(handle, "LeaseAndWarrantyProvider_Create_InstanceMI", broker);
-}
-
-CMPIAssociationMI* ProviderLibrary::createAssociationMI(const CMPIBroker* broker) const {
-    return callFactory<CMPIAssociationMI>(handle, "LeaseAndWarrantyProvider_Create_AssociationMI", broker);
+ProviderInterfaces ProviderLibrary::createInterfaces(const CMPIBroker* broker) const {
+    return {callFactory<CMPIInstanceMI>(handle, "LeaseAndWarrantyProvider_Create_InstanceMI", broker),
+            callFactory<CMPIAssociationMI>(handle, "LeaseAndWarrantyProvider_Create_AssociationMI", broker)};
 }
 
 }  // namespace gate

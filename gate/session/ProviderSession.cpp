@@ -9,18 +9,16 @@ namespace {
 constexpr const char** allProperties = nullptr;
 constexpr const char* any = nullptr;
 
-template <auto function, class... Answer>
-void callResult(const ClientRequest& request, Answer... answer) {
-    request.requireManager();
-    requireOk("accept the answer", tell<function>(request.result, answer...));
-}
-
+/** Returns answers with a function of the request's result. */
 template <auto function, class Answer>
 void giveAll(const ClientRequest& request, const std::vector<Answer>& answers) {
+    constexpr const char* task = "accept the answer";
     for (const Answer& answer : answers) {
-        callResult<function>(request, answer);
+        request.requireManager();
+        requireOk(task, tell<function>(request.result, answer));
     }
-    callResult<&CMPIResultFT::returnDone>(request);
+    request.requireManager();
+    requireOk(task, tell<&CMPIResultFT::returnDone>(request.result));
 }
 
 [[noreturn]] void failUnfinished() {
@@ -38,6 +36,78 @@ bool hasKeys(const CMPIInstance* instance, const CMPIObjectPath* path, const Cla
     });
 }
 
+constexpr CMPIStatus done{CMPI_RC_OK, nullptr};
+
+/** The provider's answer to a request. Its objects belong to the object manager, which frees them with the request. */
+struct ProviderAnswer {
+    Instances instances{};
+    Paths paths{};
+    bool isDone = false;  ///< whether the provider called returnDone
+};
+
+ProviderAnswer& answerOf(const CMPIResult* result) {
+    return *static_cast<ProviderAnswer*>(result->hdl);
+}
+
+/** The functions that the provider calls, of a CMPI result that collects its answer to be checked. */
+CMPIResultFT collectorFunctions{
+    CMPIVersion200,
+    nullptr,
+    nullptr,
+    nullptr,
+    [](const CMPIResult* result, const CMPIInstance* instance) {
+        answerOf(result).instances.push_back(instance);
+        return done;
+    },
+    [](const CMPIResult* result, const CMPIObjectPath* path) {
+        answerOf(result).paths.push_back(path);
+        return done;
+    },
+    [](const CMPIResult* result) {
+        answerOf(result).isDone = true;
+        return done;
+    },
+    nullptr,
+};
+
+template <class Function>
+CMPIInstanceMI* interfaceOf(Function CMPIInstanceMIFT::*) {
+    return theConnection.interfaces().instances;
+}
+
+template <class Function>
+CMPIAssociationMI* interfaceOf(Function CMPIAssociationMIFT::*) {
+    return theConnection.interfaces().associations;
+}
+
+/** Calls a function of one of the provider's interfaces. */
+template <auto function, class... Arguments>
+ProviderAnswer call(const ClientRequest& request, const LocalObject& path, Arguments... arguments) {
+    auto* const interface = interfaceOf(function);
+    ProviderAnswer answer;
+    const CMPIResult result{&answer, &collectorFunctions};
+    theConnection.wrappedBroker().hasFailed = false;
+    const CMPIStatus status =
+        (interface->ft->*function)(interface, request.context, &result, path.path(), arguments...);
+    if (status.rc != CMPI_RC_OK) {
+        const std::string reason = toString(status.msg);
+        fail(status.rc, reason.empty() ? "The provider returned code " + std::to_string(status.rc) + "." : reason);
+    }
+    request.requireManager();
+    return answer;
+}
+
+/** The same for a function that ends its answer and omits objects that the provider cannot create. */
+template <auto function, class... Arguments>
+ProviderAnswer read(const ClientRequest& request, const LocalObject& path, Arguments... arguments) {
+    ProviderAnswer answer = call<function>(request, path, arguments...);
+    require(!theConnection.wrappedBroker().hasFailed, "create the paths and instances of the answer");
+    if (!answer.isDone) {
+        failUnfinished();
+    }
+    return answer;
+}
+
 }  // namespace
 
 const CMPIBroker* ClientRequest::broker() const {
@@ -51,9 +121,8 @@ const CMPIBroker* ClientRequest::broker() const {
 const Class& ClientRequest::requestedClass() const {
     const std::string name = classNameOf(path);
     const Class* found = findClass(name);
-    if (found == nullptr || sameName(name, computerClass)) {
-        fail(CMPI_RC_ERR_INVALID_CLASS, "This provider does not serve the class \"" + name + "\".");
-    }
+    failIf(found == nullptr || sameName(name, computerClass), CMPI_RC_ERR_INVALID_CLASS,
+           "This provider does not serve the class \"", name, "\".");
     return *found;
 }
 
@@ -74,71 +143,43 @@ ProviderSession::ProviderSession(const ClientRequest& itsRequest, Access access)
     theConnection.requireCurrent(guard, isReading);
 }
 
-/** Calls a function of one of the provider's interfaces. */
-template <auto function, class Interface, class... Arguments>
-ProviderAnswer ProviderSession::call(Interface* interface, const LocalObject& path, Arguments... arguments) const {
-    ResultCollector result;
-    theConnection.wrappedBroker().forgetFailures();
-    const CMPIStatus status =
-        (interface->ft->*function)(interface, request.context, result.handle(), path.path(), arguments...);
-    if (status.rc != CMPI_RC_OK) {
-        const std::string reason = toString(status.msg);
-        fail(status.rc, reason.empty() ? "The provider returned code " + std::to_string(status.rc) + "." : reason);
-    }
-    request.requireManager();
-    return std::move(result.answer);
-}
-
-/** The same for a function of the provider that ends its answer and omits objects that it cannot create. */
-template <auto function, class Interface, class... Arguments>
-ProviderAnswer ProviderSession::read(Interface* interface, const LocalObject& path, Arguments... arguments) const {
-    ProviderAnswer answer = call<function>(interface, path, arguments...);
-    require(!theConnection.wrappedBroker().hasFailed(), "create the paths and instances of the answer");
-    if (!answer.isDone) {
-        failUnfinished();
-    }
-    return answer;
-}
-
 Paths ProviderSession::names(const Class& owner) const {
     const LocalObject path(nameSpaceOf(request.path), owner);
-    Paths paths = read<&CMPIInstanceMIFT::enumerateInstanceNames>(theConnection.instanceInterface(), path).paths;
-    theConnection.hasRead(owner, paths.size());
+    Paths paths = read<&CMPIInstanceMIFT::enumerateInstanceNames>(request, path).paths;
+    theConnection.requireRead(owner, paths.size());
     return paths;
 }
 
-/** Fails unless the provider has read the records of a class. Lists them once after the provider was loaded. */
+/**
+ * Fails unless the provider has read the records of a class, or of both classes that an association connects. Lists
+ * them once after the provider was loaded.
+ */
 void ProviderSession::requireRead(const Class& owner) const {
-    if (!theConnection.hasRead(owner, std::nullopt)) {
-        names(owner);
+    for (const Property& property : owner) {
+        if (property.referenceClass != nullptr) {
+            requireRead(*findClass(property.referenceClass));
+        }
     }
-}
-
-/** The same for the class that an association connects with computers. */
-void ProviderSession::requireElementsRead(const Class& association) const {
-    for (const Property& end : association) {
-        requireRead(*findClass(end.referenceClass));
+    const auto* table = theConnection.tableOf(owner);
+    if (table != nullptr && !table->isRead) {
+        names(owner);
     }
 }
 
 Instances ProviderSession::instances(const Class& owner) const {
     requireRead(owner);
     const LocalObject path(nameSpaceOf(request.path), owner);
-    return read<&CMPIInstanceMIFT::enumerateInstances>(theConnection.instanceInterface(), path, allProperties)
-        .instances;
+    return read<&CMPIInstanceMIFT::enumerateInstances>(request, path, allProperties).instances;
 }
 
 Paths ProviderSession::associatorNames(const LocalObject& computer, const Class& association) const {
-    requireElementsRead(association);
-    return read<&CMPIAssociationMIFT::associatorNames>(theConnection.associationInterface(), computer, association.name,
-                                                       any, any, any)
-        .paths;
+    requireRead(association);
+    return read<&CMPIAssociationMIFT::associatorNames>(request, computer, association.name, any, any, any).paths;
 }
 
 Instances ProviderSession::associators(const LocalObject& computer, const Class& association) const {
-    requireElementsRead(association);
-    return read<&CMPIAssociationMIFT::associators>(theConnection.associationInterface(), computer, association.name,
-                                                   any, any, any, allProperties)
+    requireRead(association);
+    return read<&CMPIAssociationMIFT::associators>(request, computer, association.name, any, any, any, allProperties)
         .instances;
 }
 
@@ -149,22 +190,19 @@ const CMPIInstance* ProviderSession::find(const LocalObject& keys, const Class& 
         return agent != nullptr && hasKeys(agent, keys.path(), owner) ? agent : nullptr;
     }
     requireRead(owner);
-    return firstOf(
-        read<&CMPIInstanceMIFT::getInstance>(theConnection.instanceInterface(), keys, allProperties).instances);
+    return firstOf(read<&CMPIInstanceMIFT::getInstance>(request, keys, allProperties).instances);
 }
 
 const CMPIInstance* ProviderSession::get(const LocalObject& keys, const Class& owner) const {
     const CMPIInstance* instance = find(keys, owner);
-    if (instance == nullptr) {
-        fail(CMPI_RC_ERR_NOT_FOUND, std::string("There is no such ") + owner.name + ".");
-    }
+    failIf(instance == nullptr, CMPI_RC_ERR_NOT_FOUND, "There is no such ", owner.name, ".");
     return instance;
 }
 
 const CMPIInstance* ProviderSession::create(const LocalObject& keys) {
     // The provider ignores the instance.
-    const CMPIInstance* created = firstOf(
-        read<&CMPIInstanceMIFT::createInstance>(theConnection.instanceInterface(), keys, keys.instance()).instances);
+    const CMPIInstance* created =
+        firstOf(read<&CMPIInstanceMIFT::createInstance>(request, keys, keys.instance()).instances);
     if (created == nullptr) {
         failUnfinished();
     }
@@ -172,11 +210,11 @@ const CMPIInstance* ProviderSession::create(const LocalObject& keys) {
 }
 
 void ProviderSession::modify(const LocalObject& keys, const LocalObject& values) {
-    call<&CMPIInstanceMIFT::modifyInstance>(theConnection.instanceInterface(), keys, values.instance(), allProperties);
+    call<&CMPIInstanceMIFT::modifyInstance>(request, keys, values.instance(), allProperties);
 }
 
 void ProviderSession::remove(const LocalObject& keys) {
-    call<&CMPIInstanceMIFT::deleteInstance>(theConnection.instanceInterface(), keys);
+    call<&CMPIInstanceMIFT::deleteInstance>(request, keys);
 }
 
 }  // namespace gate

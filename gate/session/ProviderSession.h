@@ -4,8 +4,7 @@
 #include <vector>
 
 #include "ProviderConnection.h"
-#include "gate/cmpi/LocalObject.h"
-#include "gate/cmpi/ResultCollector.h"
+#include "gate/cmpi/Objects.h"
 
 namespace gate {
 
@@ -56,8 +55,8 @@ struct ClientRequest {
  * An object manager may crash while a client's object is read: SFCB does for a string that was sent as an integer.
  * Begin the session before you read a client's keys and values: then no data file is being written.
  *
- * The provider logs its errors and returns success. An answer that was not ended, or has
- * another number of records than the file, is a Failure here; the caller has to check the result of a change.
+ * The provider logs its errors and returns success. An answer that was not ended, or has another number of records than
+ * the file, is a Failure here; the caller has to check the result of a change.
  */
 class ProviderSession {
 public:
@@ -65,8 +64,6 @@ public:
 
     /** Begins the session. For a change, this process must own the data directory. */
     explicit ProviderSession(const ClientRequest& itsRequest, Access access = Access::read);
-
-    const CMPIBroker* broker() const { return request.broker(); }
 
     /** @name All instances of a class, in the request's namespace */
     ///@{
@@ -91,9 +88,6 @@ public:
     void modify(const LocalObject& keys, const LocalObject& values);
     void remove(const LocalObject& keys);
 
-    /** Marks the provider's tables as wrong: it is loaded again before the next request. */
-    void setOutdated() const { theConnection.setOutdated(); }
-
     /**
      * Releases the lock for a call of the object manager that may take long or lead back to the gate. Another request
      * may load the provider again meanwhile.
@@ -106,12 +100,6 @@ public:
 
 private:
     void requireRead(const Class& owner) const;
-    void requireElementsRead(const Class& association) const;
-
-    template <auto function, class Interface, class... Arguments>
-    ProviderAnswer call(Interface* interface, const LocalObject& path, Arguments... arguments) const;
-    template <auto function, class Interface, class... Arguments>
-    ProviderAnswer read(Interface* interface, const LocalObject& path, Arguments... arguments) const;
 
     LockGuard guard;
     const ClientRequest& request;

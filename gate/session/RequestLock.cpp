@@ -28,27 +28,20 @@ struct RequestLock::Waiter {
         wakeUp.notify_one();
     }
 
-    void appendTo(Waiter*& list) {
-        Waiter** link = &list;
-        while (*link != nullptr) {
-            link = &(*link)->next;
-        }
-        *link = this;
-    }
-
-    void removeFrom(Waiter*& list) {
-        Waiter** link = &list;
-        while (*link != this) {
-            link = &(*link)->next;
-        }
-        *link = next;
-    }
-
     IfClosed ifClosed = IfClosed::fail;
     Result result = Result::none;
     std::condition_variable wakeUp{};
     Waiter* next = nullptr;
 };
+
+/** The link of a list that points to a waiter, or the null link at its end. */
+RequestLock::Waiter*& RequestLock::linkTo(const Waiter* waiter, Waiter*& list) {
+    Waiter** link = &list;
+    while (*link != waiter) {
+        link = &(*link)->next;
+    }
+    return *link;
+}
 
 bool RequestLock::beginRequest() noexcept {
     const std::lock_guard<std::mutex> lock(mutex);
@@ -88,7 +81,7 @@ bool RequestLock::waitForLock(std::unique_lock<std::mutex>& lock, IfClosed ifClo
     if (canWait && (isHeld || state == State::closed)) {
         Waiter self;
         self.ifClosed = ifClosed;
-        self.appendTo(waiters);
+        linkTo(nullptr, waiters) = &self;
         self.wakeUp.wait(lock, [&] { return self.result != Waiter::Result::none; });
         isHeldHere = self.result == Waiter::Result::admitted;
     } else {
@@ -119,9 +112,9 @@ void RequestLock::release() noexcept {
     notifyClosers();
 }
 
-/** Passes the lock directly to the longest waiter, so that a newcomer cannot overtake it. */
+/** Passes the lock, if it is free and open, directly to the longest waiter, so that a newcomer cannot overtake it. */
 void RequestLock::admitNext() {
-    if (waiters != nullptr && state != State::closed) {
+    if (waiters != nullptr && !isHeld && state != State::closed) {
         isHeld = true;
         std::exchange(waiters, waiters->next)->end(Waiter::Result::admitted);
     }
@@ -146,11 +139,11 @@ bool RequestLock::close(std::chrono::milliseconds drainTimeout, Closing closing,
     }
     state = State::closing;
     Waiter self;
-    self.appendTo(closers);
+    linkTo(nullptr, closers) = &self;
     const auto isClosedByOther = [&, before = generation()] { return timesClosed != before; };
     self.wakeUp.wait_for(lock, drainTimeout, [&] { return requests <= requestsHere || isClosedByOther(); });
     self.wakeUp.wait(lock, [&] { return !isHeld || isHeldHere || isClosedByOther(); });
-    self.removeFrom(closers);
+    linkTo(&self, closers) = self.next;
     if (isClosedByOther()) {
         return false;
     }
@@ -172,9 +165,7 @@ bool RequestLock::open() noexcept {
     const std::lock_guard<std::mutex> lock(mutex);
     if (state == State::closed && !isPermanent) {
         state = State::open;
-        if (!isHeld) {
-            admitNext();
-        }
+        admitNext();
     }
     return state == State::open;
 }

@@ -31,8 +31,6 @@ public:
     enum class Closing { temporary, permanent };
 
     constexpr RequestLock() = default;
-    RequestLock(const RequestLock&) = delete;
-    RequestLock& operator=(const RequestLock&) = delete;
 
     /** Whether the request is admitted. If so, it has to call endRequest(). */
     bool beginRequest() noexcept;
@@ -80,6 +78,7 @@ private:
     void refuseWaiters();
     void admitNext();
     void notifyClosers();
+    static Waiter*& linkTo(const Waiter* waiter, Waiter*& list);
     std::size_t count(Waiter* const& first) const noexcept;
 
     mutable std::mutex mutex{};
@@ -133,8 +132,6 @@ public:
             theRequestLock.release();
         }
     }
-    LockGuard(const LockGuard&) = delete;
-    LockGuard& operator=(const LockGuard&) = delete;
 
     /** Releases the lock for some work. Throws ManagerGone, without the lock, if it was closed meanwhile. */
     template <class Work>

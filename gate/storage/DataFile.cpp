@@ -2,20 +2,18 @@
 
 #include <fcntl.h>
 #include <sys/stat.h>
-#include <sys/statvfs.h>
 #include <unistd.h>
 
 #include <algorithm>
+#include <cctype>
 #include <cerrno>
 #include <filesystem>
-#include <iterator>
 #include <sstream>
 #include <string_view>
 #include <system_error>
 
 #include "KO/PlatformUtilities.h"
 #include "durable/Files.h"
-#include "durable/RecordFile.h"
 
 namespace gate {
 
@@ -31,16 +29,8 @@ std::string pathOf(const DataFile& file) {
     return std::string(KO::PlatformUtilities::getKelsaDataDir()) + file.fileName;
 }
 
-durable::RecordFile recordFileOf(const DataFile& file) {
-    return durable::recordFileIn(KO::PlatformUtilities::getKelsaDataDir(), file.fileName);
-}
-
 [[noreturn]] void failToStore(const std::string& path, const std::string& reason) {
-    fail(CMPI_RC_ERR_FAILED, "The change cannot be stored in " + path + ": " + reason + ".");
-}
-
-std::string reasonOf(int error) {
-    return std::generic_category().message(error);
+    fail(CMPI_RC_ERR_FAILED, "The change cannot be stored in ", path, ": ", reason, ".");
 }
 
 /** Fails if the file exists and cannot be written or is not a regular file. */
@@ -50,7 +40,7 @@ void requireWritableFile(const std::string& path) {
         return;
     }
     if (descriptor < 0) {
-        failToStore(path, reasonOf(errno));
+        throw std::system_error(errno, std::generic_category(), path);
     }
     struct stat status {};
     const bool isRegular = fstat(descriptor, &status) == 0 && S_ISREG(status.st_mode);
@@ -63,22 +53,16 @@ void requireWritableFile(const std::string& path) {
 /** Whether the file system has room for the file's growth and for a block that is partly used. */
 bool hasRoom(const std::string& directory, std::size_t growth) {
     constexpr std::size_t block = 4096;
-    struct statvfs system {};
-    const bool isKnown = statvfs(directory.c_str(), &system) == 0 && system.f_blocks != 0 && system.f_frsize != 0;
-    if (growth == 0 || !isKnown) {
-        return true;  // unknown; the check after the change decides
-    }
-    const auto blocks = geteuid() == 0 ? system.f_bfree : system.f_bavail;  // the last blocks are reserved for root
-    return blocks > (growth + block) / system.f_frsize;
+    std::error_code error;
+    const auto space = std::filesystem::space(directory, error);
+    const bool isKnown = !error && space.capacity != 0;               // otherwise, the check after the change decides
+    const auto room = geteuid() == 0 ? space.free : space.available;  // the last blocks are reserved for root
+    return growth == 0 || !isKnown || room > growth + block;
 }
 
 /** Whether the provider splits a record file at a character. */
 bool isSpace(char each) {
     return std::string_view(" \t\n\v\f\r").find(each) != std::string_view::npos;
-}
-
-bool isDigit(char each) {
-    return each >= '0' && each <= '9';
 }
 
 /** Whether a line of a record file is the identifier, and the provider reads it as one. */
@@ -88,17 +72,11 @@ bool hasRecord(const std::string& content, std::string identifier) {
            ('\n' + content).find('\n' + identifier + '\n') != std::string::npos;
 }
 
-/** Calls a function, and reports the errors of files to the client. */
-template <class Work>
-auto onFiles(Work work) {
-    try {
-        return work();
-    } catch (const std::system_error& error) {
-        fail(CMPI_RC_ERR_FAILED, std::string("The change cannot be stored in ") + error.what() + ".");
-    }
-}
-
 }  // namespace
+
+durable::RecordFile DataFile::records() const {
+    return durable::recordFileIn(KO::PlatformUtilities::getKelsaDataDir(), fileName);
+}
 
 void DataFile::requireWritable(std::size_t growth) const {
     const std::string path = pathOf(*this);
@@ -106,34 +84,19 @@ void DataFile::requireWritable(std::size_t growth) const {
     requireWritableFile(path);
     // A rollback and the change of a property file replace the file.
     if (access(directory.c_str(), W_OK | X_OK) != 0) {
-        failToStore(path, "the data directory " + directory + ": " + reasonOf(errno));
+        throw std::system_error(errno, std::generic_category(), path + ": the data directory " + directory);
     }
     if (!hasRoom(directory, growth)) {
-        failToStore(path, reasonOf(ENOSPC));
+        throw std::system_error(ENOSPC, std::generic_category(), path);
     }
 }
 
 FileState DataFile::state() const {
     const std::string path = pathOf(*this);
-    struct stat status {};
-    stat(path.c_str(), &status);
-    return onFiles([&] {
-        const auto content = hasRecords ? recordFileOf(*this).content() : durable::readFile(path);
-        return FileState{content.value_or(std::string()),
-                         status.st_mtim.tv_sec * 1000000000LL + status.st_mtim.tv_nsec};
-    });
-}
-
-bool DataFile::hasCount(std::size_t count) const {
-    return onFiles([&] {
-        const durable::RecordFile file = recordFileOf(*this);
-        const auto promised = durable::RecordFile::promisedIn(file.content().value_or(std::string()));
-        return !file.needsRecovery() && promised.value_or(0) == count;
-    });
-}
-
-bool DataFile::isStored() const {
-    return onFiles([&] { return recordFileOf(*this).isStored(); });
+    std::error_code ignored;
+    const auto modified = std::filesystem::last_write_time(path, ignored);
+    const auto content = hasRecords ? records().content() : durable::readFile(path);
+    return {content.value_or(std::string()), modified};
 }
 
 bool DataFile::mayHave(const std::string& content, std::string identifier) const {
@@ -142,13 +105,14 @@ bool DataFile::mayHave(const std::string& content, std::string identifier) const
         const std::size_t end = start + identifier.size();
         const bool isEnded = end == content.size() || isSpace(content[end]);
         // A word also begins after a number that is followed by other characters.
-        return isEnded && (start == 0 || isSpace(content[start - 1]) || isDigit(content[start - 1]));
+        return isEnded && (start == 0 || isSpace(content[start - 1]) ||
+                           std::isdigit(static_cast<unsigned char>(content[start - 1])) != 0);
     };
     std::size_t found = content.find(identifier);
     while (found != std::string::npos && !isWord(found)) {
         found = content.find(identifier, found + 1);
     }
-    return found != std::string::npos || !recordFileOf(*this).isComplete(content);
+    return found != std::string::npos || !records().isComplete(content);
 }
 
 std::string DataFile::firstIdentifier(const std::string& content) {
@@ -160,10 +124,7 @@ std::string DataFile::firstIdentifier(const std::string& content) {
 }
 
 void DataFile::begin(FileState& before) const {
-    before.restorable = before.content;
-    if (hasRecords) {
-        before.restorable = onFiles([&] { return recordFileOf(*this).prepare(before.content); });
-    }
+    before.restorable = hasRecords ? records().prepare(before.content) : before.content;
 }
 
 void DataFile::commit(const FileState& before, bool mustDiffer, const std::string* identifier) const {
@@ -171,38 +132,32 @@ void DataFile::commit(const FileState& before, bool mustDiffer, const std::strin
         return;
     }
     const FileState now = state();
-    if (mustDiffer && now == before) {
-        fail(CMPI_RC_ERR_FAILED, std::string(fileName) + " was not written.");
-    }
-    const durable::RecordFile file = recordFileOf(*this);
+    failIf(mustDiffer && now == before, CMPI_RC_ERR_FAILED, fileName, " was not written.");
+    const durable::RecordFile file = records();
     if (!file.isComplete(now.content)) {
         failToStore(file.path(), "it does not hold all records; the disk may be full");
     }
     if (identifier != nullptr && !hasRecord(now.content, *identifier)) {
-        fail(CMPI_RC_ERR_FAILED, std::string(fileName) + " does not hold " + *identifier + ".");
+        fail(CMPI_RC_ERR_FAILED, fileName, " does not hold ", *identifier, ".");
     }
-    onFiles([&] { file.commit(now.content); });
+    file.commit(now.content);
 }
 
 void DataFile::rollBack(const FileState& before) const {
     if (hasRecords && before.restorable.empty()) {
         failToStore(pathOf(*this), "it was damaged before, and there is no saved copy");
     }
-    onFiles([&] {
-        if (hasRecords) {
-            recordFileOf(*this).restore(before.restorable);
-        } else if (!(state() == before)) {
-            const std::string path = std::filesystem::canonical(pathOf(*this));  // replaces the target of a link
-            durable::replaceFile(path, before.content, path);
-            durable::syncDirectoryOf(path);
-        }
-    });
+    if (hasRecords) {
+        records().restore(before.restorable);
+    } else if (!(state() == before)) {
+        const std::string path = std::filesystem::canonical(pathOf(*this));  // replaces the target of a link
+        durable::replaceFile(path, before.content, path);
+        durable::syncDirectoryOf(path);
+    }
 }
 
 const DataFile* dataFileOf(const Class& owner) {
-    const auto found = std::find_if(std::begin(dataFiles), std::end(dataFiles),
-                                    [&](const DataFile& file) { return sameName(file.className, owner.name); });
-    return found == std::end(dataFiles) ? nullptr : found;
+    return cim::findNamed(dataFiles, owner.name);
 }
 
 }  // namespace gate

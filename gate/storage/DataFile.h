@@ -1,18 +1,19 @@
 #pragma once
 
 #include <cstddef>
-#include <cstdint>
+#include <filesystem>
 #include <string>
 
+#include "durable/RecordFile.h"
 #include "gate/cmpi/Objects.h"
 
 namespace gate {
 
 /** The content of a data file and the time of its last change, which are compared. */
 struct FileState {
-    std::string content;        ///< empty if the file does not exist
-    std::int64_t modified = 0;  ///< nanoseconds
-    std::string restorable{};   ///< content for rollBack(); empty if it is unknown
+    std::string content;  ///< empty if the file does not exist
+    std::filesystem::file_time_type modified{};
+    std::string restorable{};  ///< content for rollBack(); empty if it is unknown
 
     bool operator==(const FileState& other) const { return modified == other.modified && content == other.content; }
 };
@@ -21,10 +22,10 @@ struct FileState {
  * A class's data file. The provider writes it and does not report errors, so the gate checks it around each change, and
  * keeps a copy of a record file that is always complete (durable/RecordFile.h).
  *
- * All functions fail with CMPI_RC_ERR_FAILED, the file and the reason.
+ * Functions fail with CMPI_RC_ERR_FAILED, the file and the reason, or throw std::system_error with these.
  */
 struct DataFile {
-    const char* className;
+    const char* name;  ///< of the class
     const char* fileName;
     bool hasRecords;  ///< false for a property file, whose instances are neither created nor deleted
 
@@ -37,11 +38,7 @@ struct DataFile {
 
     FileState state() const;
 
-    /** Whether the record file or a copy has content. */
-    bool isStored() const;
-
-    /** Whether the record file needs no recovery and has this number of records. */
-    bool hasCount(std::size_t count) const;
+    durable::RecordFile records() const;
 
     /** Whether a record may have the identifier: the record file is incomplete, or a word of it is the identifier. */
     bool mayHave(const std::string& content, std::string identifier) const;

@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <exception>
 #include <iterator>
+#include <system_error>
 
 namespace gate {
 
@@ -19,17 +20,25 @@ std::size_t sizeOf(const Values& values) {
     return size;
 }
 
-}  // namespace
+/** Calls a function, and reports the errors of files to the client. */
+template <class Work>
+auto onFiles(Work work) {
+    try {
+        return work();
+    } catch (const std::system_error& error) {
+        fail(CMPI_RC_ERR_FAILED, "The change cannot be stored in ", error.what(), ".");
+    }
+}
 
-Transaction::Transaction(ProviderSession& itsSession, const Class& itsClass, const DataFile& itsFile,
-                         const LocalObject& itsPath)
-    : session(itsSession), owner(itsClass), file(itsFile), path(itsPath) {}
+}  // namespace
 
 /** Returns the state of the file before a change. Fails if the change cannot be written or would lose records. */
 FileState Transaction::open(std::size_t growth) const {
-    file.requireWritable(growth);
-    requireTable();
-    return file.state();
+    return onFiles([&] {
+        file.requireWritable(growth);
+        requireTable();
+        return file.state();
+    });
 }
 
 /**
@@ -38,9 +47,9 @@ FileState Transaction::open(std::size_t growth) const {
  */
 template <class Change>
 void Transaction::run(FileState before, Change change) const {
-    file.begin(before);
+    onFiles([&] { file.begin(before); });
     try {
-        change(before);
+        onFiles([&] { change(before); });
     } catch (Failure& failure) {
         failure.message += rollBack(before);
         throw;
@@ -49,7 +58,7 @@ void Transaction::run(FileState before, Change change) const {
         if (note.empty()) {
             throw;
         }
-        fail(CMPI_RC_ERR_FAILED, std::string("The request failed: ") + exception.what() + "." + note);
+        fail(CMPI_RC_ERR_FAILED, "The request failed: ", exception.what(), ".", note);
     } catch (...) {
         rollBack(before);
         throw;
@@ -60,9 +69,9 @@ void Transaction::run(FileState before, Change change) const {
 std::string Transaction::rollBack(const FileState& before) const {
     try {
         if (file.hasRecords && !before.restorable.empty()) {
-            session.setOutdated();
+            theConnection.setOutdated();
         }
-        file.rollBack(before);
+        onFiles([&] { file.rollBack(before); });
         return {};
     } catch (const Failure& failure) {
         return " The change could not be rolled back. " + failure.message;
@@ -72,10 +81,11 @@ std::string Transaction::rollBack(const FileState& before) const {
 }
 
 void Transaction::create(const std::string& identifier, const Values& given, const std::function<void()>& returnPath) {
-    requireRoundTrip(file, *cim::findNamed(owner, identifierKey), identifier);
+    requireRoundTrip(file, {{cim::findNamed(owner, identifierKey), identifier}});
     requireRoundTrip(file, given);
     const FileState start = open(identifier.size() + 1 + sizeOf(given));
-    requireNew(identifier, start.content);
+    const bool exists = file.mayHave(start.content, identifier) && session.find(path, owner) != nullptr;
+    failIf(exists, CMPI_RC_ERR_ALREADY_EXISTS, owner.name, " ", identifier, " already exists.");
     requireReadOnlyValues(given, start.content);
     run(start, [&](const FileState& before) {
         const CMPIInstance* current = session.create(path);
@@ -115,19 +125,21 @@ void Transaction::apply(const CMPIInstance* current, const Values& changes) cons
  * report that it could not read the file.
  */
 void Transaction::requireTable() const {
-    if (!file.hasRecords || (theConnection.isVerified(owner) && file.isStored())) {
+    if (!file.hasRecords || (theConnection.tableOf(owner)->isVerified && file.records().isStored())) {
         return;
     }
     const Paths paths = session.names(owner);
-    if (!paths.empty() && !file.isStored()) {
+    if (!paths.empty() && !file.records().isStored()) {
         storeTable(paths.front());
     }
-    if (!file.hasCount(paths.size())) {
-        session.setOutdated();
-        fail(CMPI_RC_ERR_FAILED, std::string(file.fileName) +
-                                     " has other records than the provider. It is read again; repeat the request.");
+    const durable::RecordFile records = file.records();
+    const auto promised = durable::RecordFile::promisedIn(records.content().value_or(std::string()));
+    if (promised.value_or(0) != paths.size() || records.needsRecovery()) {
+        theConnection.setOutdated();
+        fail(CMPI_RC_ERR_FAILED, file.fileName,
+             " has other records than the provider. It is read again; repeat the request.");
     }
-    theConnection.setVerified(owner);
+    theConnection.tableOf(owner)->isVerified = true;
 }
 
 /** Stores records that are only in memory, since their file was removed, by setting a value to itself. */
@@ -139,13 +151,6 @@ void Transaction::storeTable(const CMPIObjectPath* record) const {
     const std::string current = propertyOf(session.get(changed, owner), *number).value();
     session.modify(changed, LocalObject({}, owner, {{number, current}}));
     file.commit({}, true);
-}
-
-/** Fails if there is a record with the identifier. Asks the provider only if the file may have one. */
-void Transaction::requireNew(const std::string& identifier, const std::string& content) const {
-    if (file.mayHave(content, identifier) && session.find(path, owner) != nullptr) {
-        fail(CMPI_RC_ERR_ALREADY_EXISTS, std::string(owner.name) + " " + identifier + " already exists.");
-    }
 }
 
 /** A record of the file; null if it has none. Lists the names only if it has lost the first record's identifier. */

@@ -4,7 +4,7 @@
 #include <functional>
 #include <string>
 
-#include "Differences.h"
+#include "StoredValues.h"
 #include "gate/session/ProviderSession.h"
 
 namespace gate {
@@ -20,8 +20,8 @@ namespace gate {
  */
 class Transaction {
 public:
-    Transaction(ProviderSession& itsSession, const Class& itsClass, const DataFile& itsFile,
-                const LocalObject& itsPath);
+    Transaction(ProviderSession& itsSession, const Class& itsClass, const DataFile& itsFile, const LocalObject& itsPath)
+        : session(itsSession), owner(itsClass), file(itsFile), path(itsPath) {}
 
     /**
      * Creates a record with these values. Fails with CMPI_RC_ERR_ALREADY_EXISTS if there is one with the identifier.
@@ -44,7 +44,6 @@ private:
     void apply(const CMPIInstance* current, const Values& changes) const;
     void requireTable() const;
     void storeTable(const CMPIObjectPath* record) const;
-    void requireNew(const std::string& identifier, const std::string& content) const;
     const CMPIInstance* anyRecord(const std::string& content) const;
     void requireReadOnlyValues(const Values& given, const std::string& content) const;
 

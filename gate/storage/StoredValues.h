@@ -1,10 +1,18 @@
 #pragma once
 
-#include "RoundTrip.h"
+#include "DataFile.h"
 
 // The effects of a change of values on the instance, the provider and the data file.
 
 namespace gate {
+
+/**
+ * Refuses keys and writable values that a client would not read back as it wrote them, also after the object manager is
+ * restarted: the data files lose some values (docs/data-files.md), and object managers remove blanks at their ends.
+ * Fails with CMPI_RC_ERR_INVALID_PARAMETER, the property and the reason. Accepts all values if the agent's
+ * configuration says refuse_lossy_values = false.
+ */
+void requireRoundTrip(const DataFile& file, const Values& values);
 
 /**
  * The given values that differ from the current instance's. Fails with CMPI_RC_ERR_INVALID_PARAMETER, naming the

@@ -1,18 +1,14 @@
-#include "Differences.h"
+#include "StoredValues.h"
 
 #include <algorithm>
 #include <string_view>
 
+#include "KO/Settings.h"
 #include "cim/DateTime.h"
 
 namespace gate {
 
 namespace {
-
-/** The clock, of which a client always sends back an old value. */
-bool isClock(const Property& property) {
-    return sameName(property.name, "LocalDateTime");
-}
 
 /** Whether the provider copies the value from the preceding property where none is sent. */
 bool isPersonalized(const Property& property) {
@@ -31,11 +27,6 @@ bool isAmong(const Property& property, const Values& values) {
 /** The value in the data file. The provider returns "Null" for a personalized value that is empty there. */
 std::string storedValue(const Property& property, const std::string& returned) {
     return isPersonalized(property) && returned == "Null" ? std::string() : returned;
-}
-
-/** The value in a record file of a property that is null. */
-std::string storedNull(const Property& property) {
-    return isDate(property) ? std::string(cim::noDate) : property.type == CMPI_string ? "" : "0";
 }
 
 /** The datetime with the offset "-000", if it is zero: "+000" is equal. */
@@ -74,50 +65,38 @@ bool isCurrent(const Property& property, const CMPIInstance* current, const std:
            (trimmed(*value, false) == given || (mayLackLetters && trimmed(*value, true) == given));
 }
 
-}  // namespace
+/** The reason why a record file or an object manager loses a string; null if they keep it. */
+const char* lossOfString(std::string_view value, bool isIdentifier) {
+    const auto has = [&](const char* characters) { return value.find_first_of(characters) != std::string_view::npos; };
+    const bool hasOuterBlank = !value.empty() && (value.front() == ' ' || value.back() == ' ');
+    const bool hasAdjacentBlanks = value.find("  ") != std::string_view::npos;
+    return has("_")            ? "an underscore is read back as a blank"
+           : has("\t\n\v\f\r") ? "a tab or line break corrupts the data file's records"
+           : hasOuterBlank     ? "object managers remove blanks at its ends"
+           : hasAdjacentBlanks ? "adjacent blanks may become one on the way to and from clients"
+           : isIdentifier      ? nullptr
+           : value == "*"      ? "\"*\" represents an empty value"
+           : value.size() == 1 ? "a value of one character is lost"
+                               : nullptr;
+}
 
-Values diff(const CMPIInstance* current, const Values& given, bool areListed) {
-    Values changes;
-    for (const auto& [property, value] : given) {
-        if (isClock(*property) || isCurrent(*property, current, value, areListed)) {
-            continue;
-        }
-        if (!property->isWritable) {
-            fail(CMPI_RC_ERR_INVALID_PARAMETER,
-                 std::string(property->name) + " is read-only. Omit it, or send it back unchanged.");
-        }
-        const bool isNoDate = isDate(*property) && cim::isNoDate(value);
-        changes.emplace_back(property, isNoDate ? std::string(cim::noDate) : value);
+/** Whether the provider returns a datetime that was stored. It returns null for one that is not valid. */
+bool isRepresentable(const DataFile& file, const std::string& dateTime) {
+    return cim::isPointInTime(dateTime) || (file.hasRecords && cim::isInterval(dateTime));
+}
+
+/** The reason why a value does not survive the round trip; null if it does. */
+const char* lossOf(const DataFile& file, const Property& property, const std::string& value) {
+    if (isDate(property)) {
+        return value == cim::noDate || isRepresentable(file, value) ? nullptr : "it is not a valid datetime";
     }
-    return changes;
+    return property.type == CMPI_string && file.hasRecords ? lossOfString(value, property.isKey) : nullptr;
 }
 
-Values valuesToSend(const Class& owner, const CMPIInstance* current, const Values& changes) {
-    Values values = changes;
-    for (const Property& property : owner) {
-        if (!isPersonalized(property) || isAmong(property, changes)) {
-            continue;
-        }
-        const auto value = propertyOf(current, property);
-        if (!value) {
-            // These properties are never null, unless the provider could not read the file.
-            fail(CMPI_RC_ERR_FAILED, std::string(property.name) + " cannot be read, so nothing is changed.");
-        }
-        values.emplace_back(&property, storedValue(property, *value));
-    }
-    return values;
+bool refusesLossyValues() {
+    // Older agents have no such setting, which means true.
+    return &KO::Settings::getFlag == nullptr || KO::Settings::getFlag("gate.refuse_lossy_values", true);
 }
-
-bool altersFile(const DataFile& file, const CMPIInstance* current, const Values& changes) {
-    return std::any_of(changes.begin(), changes.end(), [&](const auto& change) {
-        const auto& [property, value] = change;
-        const std::string before = propertyOf(current, *property).value_or(storedNull(*property));
-        return before != value && survivesRoundTrip(file, *property, before) &&
-               survivesRoundTrip(file, *property, value);
-    });
-}
-
-namespace {
 
 /** Whether the changes remove a value. Two properties may show the same one. */
 bool isRemoved(const std::string& value, const DataFile& file, const CMPIInstance* before, const Values& changes) {
@@ -133,13 +112,59 @@ void requireNothingLost(const Class& owner, const DataFile& file, const CMPIInst
         const std::string value = propertyOf(before, property).value_or(std::string());
         const std::string now = propertyOf(after, property).value_or(std::string());
         const bool isLost = storedValue(property, now).empty() && !storedValue(property, value).empty();
-        if (isLost && !isAmong(property, changes) && !isRemoved(value, file, before, changes)) {
-            fail(CMPI_RC_ERR_FAILED, std::string(property.name) + " was lost: the data file could not be read.");
-        }
+        failIf(isLost && !isAmong(property, changes) && !isRemoved(value, file, before, changes), CMPI_RC_ERR_FAILED,
+               property.name, " was lost: the data file could not be read.");
     }
 }
 
 }  // namespace
+
+void requireRoundTrip(const DataFile& file, const Values& values) {
+    for (const auto& [property, value] : values) {
+        const char* loss = property->isKey || property->isWritable ? lossOf(file, *property, value) : nullptr;
+        failIf(loss != nullptr && refusesLossyValues(), CMPI_RC_ERR_INVALID_PARAMETER, file.name, '.', property->name,
+               ": the value \"", value, "\" cannot be stored unchanged: ", loss, ".");
+    }
+}
+
+Values diff(const CMPIInstance* current, const Values& given, bool areListed) {
+    Values changes;
+    for (const auto& [property, value] : given) {
+        const bool isClock = sameName(property->name, "LocalDateTime");  // a client always sends back an old value
+        if (isClock || isCurrent(*property, current, value, areListed)) {
+            continue;
+        }
+        failIf(!property->isWritable, CMPI_RC_ERR_INVALID_PARAMETER, property->name,
+               " is read-only. Omit it, or send it back unchanged.");
+        const bool isNoDate = isDate(*property) && cim::isNoDate(value);
+        changes.emplace_back(property, isNoDate ? std::string(cim::noDate) : value);
+    }
+    return changes;
+}
+
+Values valuesToSend(const Class& owner, const CMPIInstance* current, const Values& changes) {
+    Values values = changes;
+    for (const Property& property : owner) {
+        if (!isPersonalized(property) || isAmong(property, changes)) {
+            continue;
+        }
+        const auto value = propertyOf(current, property);
+        // These properties are never null, unless the provider could not read the file.
+        failIf(!value, CMPI_RC_ERR_FAILED, property.name, " cannot be read, so nothing is changed.");
+        values.emplace_back(&property, storedValue(property, *value));
+    }
+    return values;
+}
+
+bool altersFile(const DataFile& file, const CMPIInstance* current, const Values& changes) {
+    return std::any_of(changes.begin(), changes.end(), [&](const auto& change) {
+        const auto& [property, value] = change;
+        const char* null = isDate(*property) ? cim::noDate.data() : property->type == CMPI_string ? "" : "0";
+        const std::string before = propertyOf(current, *property).value_or(null);
+        return before != value && lossOf(file, *property, before) == nullptr &&
+               lossOf(file, *property, value) == nullptr;
+    });
+}
 
 void requireChanged(const Class& owner, const DataFile& file, const CMPIInstance* before, const CMPIInstance* after,
                     const Values& changes) {
@@ -150,10 +175,8 @@ void requireChanged(const Class& owner, const DataFile& file, const CMPIInstance
         const bool isNull = !now && isDate(*property) && !isRepresentable(file, value);
         // The provider may return a word for an empty value: it suffices that it is not the former value.
         const bool isEmptied = value.empty() && now != propertyOf(before, *property);
-        if (!isEqual && !isNull && !isEmptied) {
-            fail(CMPI_RC_ERR_FAILED,
-                 std::string(property->name) + " could not be stored; see the agent's log at level 3000.");
-        }
+        failIf(!isEqual && !isNull && !isEmptied, CMPI_RC_ERR_FAILED, property->name,
+               " could not be stored; see the agent's log at level 3000.");
     }
 }
 
