@@ -130,9 +130,11 @@ void ProviderConnection::requireCurrent(LockGuard& guard, bool mayBeOlder) {
     if (isWaiting && !mayUseOlder) {
         waitWhile(guard, waitTimeout, update);
     }
-    failIf(isWaiting && !mayUseOlder, CMPI_RC_ERR_FAILED,
-           upCalls != 0 ? "The provider waits for the object manager and cannot be loaded again. Try again."
-                        : "The record files are incomplete, or another process is writing them. Try again.");
+    const bool isRefused = isWaiting && !mayUseOlder;
+    failIf(isRefused && upCalls != 0, CMPI_RC_ERR_FAILED,
+           "The provider waits for the object manager and cannot be loaded again. Try again.");
+    failIf(isRefused, CMPI_RC_ERR_FAILED,
+           "The record files are incomplete, or another process is writing them. Try again.");
 }
 
 /**

@@ -84,7 +84,9 @@ void DataFile::requireWritable(std::size_t growth) const {
     requireWritableFile(path);
     // A rollback and the change of a property file replace the file.
     if (access(directory.c_str(), W_OK | X_OK) != 0) {
-        throw std::system_error(errno, std::generic_category(), path + ": the data directory " + directory);
+        const int error = errno;
+        const std::string subject = "the data directory " + directory;
+        throw std::system_error(error, std::generic_category(), path + ": " + subject);
     }
     if (!hasRoom(directory, growth)) {
         throw std::system_error(ENOSPC, std::generic_category(), path);

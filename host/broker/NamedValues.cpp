@@ -1,17 +1,36 @@
 #include "broker/NamedValues.h"
 
+#include <array>
 #include <utility>
 
 #include "broker/Convert.h"
 #include "broker/ErrorTranslation.h"
 
 namespace cimhost {
+namespace {
+
+/**
+ * The name of a new value at a position. The objects that a thread makes usually have the same names in the same order,
+ * so it keeps the first ones, and their copies share the characters.
+ */
+Name nameAt(std::size_t position, std::string_view name) {
+    thread_local std::array<Name, 32> kept;
+    if (position >= kept.size()) {
+        return std::string(name);
+    }
+    if (kept[position] != name) {
+        kept[position] = std::string(name);
+    }
+    return kept[position];
+}
+
+}  // namespace
 
 void setNamed(std::vector<NamedValue>& values, std::string_view name, Value&& value) {
     if (NamedValue* found = findNamed(values, name)) {
         found->value = std::move(value);
     } else {
-        values.emplace_back(std::string(name), std::move(value));
+        values.emplace_back(nameAt(values.size(), name), std::move(value));
     }
 }
 
