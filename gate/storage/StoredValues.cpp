@@ -1,7 +1,9 @@
 #include "StoredValues.h"
 
 #include <algorithm>
+#include <iterator>
 #include <string_view>
+#include <utility>
 
 #include "KO/Settings.h"
 #include "cim/DateTime.h"
@@ -69,15 +71,16 @@ bool isCurrent(const Property& property, const CMPIInstance* current, const std:
 const char* lossOfString(std::string_view value, bool isIdentifier) {
     const auto has = [&](const char* characters) { return value.find_first_of(characters) != std::string_view::npos; };
     const bool hasOuterBlank = !value.empty() && (value.front() == ' ' || value.back() == ' ');
-    const bool hasAdjacentBlanks = value.find("  ") != std::string_view::npos;
-    return has("_")            ? "an underscore is read back as a blank"
-           : has("\t\n\v\f\r") ? "a tab or line break corrupts the data file's records"
-           : hasOuterBlank     ? "object managers remove blanks at its ends"
-           : hasAdjacentBlanks ? "adjacent blanks may become one on the way to and from clients"
-           : isIdentifier      ? nullptr
-           : value == "*"      ? "\"*\" represents an empty value"
-           : value.size() == 1 ? "a value of one character is lost"
-                               : nullptr;
+    const std::pair<bool, const char*> losses[] = {
+        {has("_"), "an underscore is read back as a blank"},
+        {has("\t\n\v\f\r"), "a tab or line break corrupts the data file's records"},
+        {hasOuterBlank, "object managers remove blanks at its ends"},
+        {value.find("  ") != std::string_view::npos, "adjacent blanks may become one on the way to and from clients"},
+        {!isIdentifier && value == "*", "\"*\" represents an empty value"},
+        {!isIdentifier && value.size() == 1, "a value of one character is lost"},
+        {true, nullptr},
+    };
+    return std::find_if(std::begin(losses), std::end(losses), [](const auto& loss) { return loss.first; })->second;
 }
 
 /** Whether the provider returns a datetime that was stored. It returns null for one that is not valid. */
