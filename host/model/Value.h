@@ -27,6 +27,10 @@ struct DateTime {
 /** One 16-bit character. */
 struct Char16 {
     std::uint16_t code = 0;
+
+    Char16() = default;
+    explicit Char16(std::uint16_t itsCode) : code(itsCode) {}
+    explicit operator std::uint16_t() const { return code; }
 };
 
 /**
