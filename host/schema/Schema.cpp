@@ -43,14 +43,10 @@ void checkOverride(const Class& declared, const Property& own, const Property& i
     }
 }
 
-template <typename Element>
-void checkUnique(const Class& declared, const std::vector<Element>& elements, const char* kind) {
-    for (std::size_t i = 0; i < elements.size(); ++i) {
-        for (std::size_t j = 0; j < i; ++j) {
-            if (cim::sameName(elements[i].name, elements[j].name)) {
-                throw std::invalid_argument("class " + declared.name + " declares the " + kind + " " +
-                                            elements[i].name + " twice");
-            }
+void checkUnique(const Class& declared) {
+    for (const Property& each : declared.properties) {
+        if (findNamed(declared.properties, each.name) != &each) {
+            throw std::invalid_argument("class " + declared.name + " declares the property " + each.name + " twice");
         }
     }
 }
@@ -62,9 +58,8 @@ std::vector<Property> mergeProperties(const Class& declared, const Class& super)
         markPropagated(inherited.qualifiers);
     }
     for (const Property& own : declared.properties) {
-        const auto inherited = std::find_if(merged.begin(), merged.end(),
-                                            [&](const Property& each) { return cim::sameName(each.name, own.name); });
-        if (inherited == merged.end()) {
+        Property* inherited = findNamed(merged, own.name);
+        if (inherited == nullptr) {
             merged.push_back(own);
             continue;
         }
@@ -79,9 +74,7 @@ std::vector<Property> mergeProperties(const Class& declared, const Class& super)
 std::vector<Method> mergeMethods(const Class& declared, const Class& super) {
     std::vector<Method> merged = declared.methods;
     for (const Method& inherited : super.methods) {
-        const auto overriding = std::find_if(
-            merged.begin(), merged.end(), [&](const Method& own) { return cim::sameName(own.name, inherited.name); });
-        if (overriding != merged.end()) {
+        if (Method* overriding = findNamed(merged, inherited.name)) {
             inheritQualifiers(overriding->qualifiers, inherited.qualifiers);
             continue;
         }
@@ -93,24 +86,12 @@ std::vector<Method> mergeMethods(const Class& declared, const Class& super) {
 
 }  // namespace
 
-const Qualifier* Property::findQualifier(std::string_view qualifier) const {
-    return findNamed(qualifiers, qualifier);
-}
-
 bool Property::isKey() const {
     return isTrue(findQualifier("Key"));
 }
 
 bool Property::isWritable() const {
     return isTrue(findQualifier("Write"));
-}
-
-const Property* Class::findProperty(std::string_view property) const {
-    return findNamed(properties, property);
-}
-
-const Qualifier* Class::findQualifier(std::string_view qualifier) const {
-    return findNamed(qualifiers, qualifier);
 }
 
 std::vector<const Property*> Class::keys() const {
@@ -138,10 +119,6 @@ const Class* Schema::findClass(std::string_view name) const {
     return found == byName.end() ? nullptr : found->second.get();
 }
 
-std::vector<const Class*> Schema::classes() const {
-    return inOrder;
-}
-
 bool Schema::isA(std::string_view name, std::string_view ancestor) const {
     if (cim::sameName(name, ancestor)) {
         return true;
@@ -161,7 +138,7 @@ const Class& Schema::add(Class declared) {
     if (findClass(declared.name) != nullptr) {
         throw std::invalid_argument("class " + declared.name + " is declared a second time");
     }
-    checkUnique(declared, declared.properties, "property");
+    checkUnique(declared);
     for (Property& property : declared.properties) {
         property.origin = declared.name;
     }

@@ -59,7 +59,7 @@ struct Property {
     std::vector<Qualifier> qualifiers{};
     std::string origin{};  ///< name of the class that declares it
 
-    const Qualifier* findQualifier(std::string_view qualifier) const;
+    const Qualifier* findQualifier(std::string_view qualifier) const { return cim::findNamed(qualifiers, qualifier); }
     bool isKey() const;
 
     /** Whether clients may modify it: its qualifier Write is true. */
@@ -83,8 +83,8 @@ struct Class {
     std::vector<Property> properties{};
     std::vector<Method> methods{};
 
-    const Property* findProperty(std::string_view property) const;
-    const Qualifier* findQualifier(std::string_view qualifier) const;
+    const Property* findProperty(std::string_view property) const { return cim::findNamed(properties, property); }
+    const Qualifier* findQualifier(std::string_view qualifier) const { return cim::findNamed(qualifiers, qualifier); }
     std::vector<const Property*> keys() const;
     bool isAssociation() const;
 };
@@ -102,7 +102,7 @@ public:
     const Class* findClass(std::string_view name) const;
 
     /** All classes in the order in which they were added. */
-    std::vector<const Class*> classes() const;
+    const std::vector<const Class*>& classes() const { return inOrder; }
 
     /** Whether a class is the ancestor or derived from it. An unknown class has no ancestors. */
     bool isA(std::string_view name, std::string_view ancestor) const;
