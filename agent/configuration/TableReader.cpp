@@ -53,10 +53,6 @@ const TomlValue* TableReader::find(std::string_view key, IsValid isValid, const 
     return value;
 }
 
-bool TableReader::has(std::string_view key) {
-    return find(key) != nullptr;
-}
-
 std::optional<std::string> TableReader::string(std::string_view key) {
     const TomlValue* value = find(key, isString, "must be a string");
     return value != nullptr ? std::optional<std::string>(value->as_string().str) : std::nullopt;
