@@ -33,10 +33,7 @@ struct Char16 {
     explicit operator std::uint16_t() const { return code; }
 };
 
-/**
- * A single CIM value. std::monostate is the null value. References and embedded instances are
- * shared and immutable.
- */
+/** A single CIM value. std::monostate is the null value. References and embedded instances are shared and immutable. */
 using Scalar = std::variant<std::monostate, bool, Char16, std::uint8_t, std::uint16_t, std::uint32_t, std::uint64_t,
                             std::int8_t, std::int16_t, std::int32_t, std::int64_t, float, double, std::string, DateTime,
                             std::shared_ptr<const ObjectPath>, std::shared_ptr<const Instance>>;
