@@ -8,14 +8,6 @@ namespace {
 
 using cim::findNamed;
 
-bool isTrue(const Qualifier* qualifier) {
-    if (qualifier == nullptr || qualifier->value.isNull) {
-        return false;
-    }
-    const bool* value = std::get_if<bool>(&qualifier->value.single);
-    return value != nullptr && *value;
-}
-
 void inheritQualifiers(std::vector<Qualifier>& own, const std::vector<Qualifier>& inherited) {
     for (const Qualifier& qualifier : inherited) {
         if (qualifier.flavor.toSubclass && findNamed(own, qualifier.name) == nullptr) {
@@ -86,12 +78,12 @@ std::vector<Method> mergeMethods(const Class& declared, const Class& super) {
 
 }  // namespace
 
-bool Property::isKey() const {
-    return isTrue(findQualifier("Key"));
-}
-
-bool Property::isWritable() const {
-    return isTrue(findQualifier("Write"));
+bool isTrue(const Qualifier* qualifier) {
+    if (qualifier == nullptr || qualifier->value.isNull) {
+        return false;
+    }
+    const bool* value = std::get_if<bool>(&qualifier->value.single);
+    return value != nullptr && *value;
 }
 
 std::vector<const Property*> Class::keys() const {
@@ -102,10 +94,6 @@ std::vector<const Property*> Class::keys() const {
         }
     }
     return found;
-}
-
-bool Class::isAssociation() const {
-    return isTrue(findQualifier("Association"));
 }
 
 Schema::Schema() {

@@ -28,6 +28,9 @@ struct Qualifier {
     bool isPropagated = false;  ///< inherited from a superclass, not declared
 };
 
+/** Whether a qualifier exists and is true. */
+bool isTrue(const Qualifier* qualifier);
+
 /** Kinds of elements that a qualifier may qualify, as CIM-XML names them. */
 constexpr std::array<std::string_view, 7> scopeNames{"CLASS",  "ASSOCIATION", "REFERENCE", "PROPERTY",
                                                      "METHOD", "PARAMETER",   "INDICATION"};
@@ -60,10 +63,10 @@ struct Property {
     std::string origin{};  ///< name of the class that declares it
 
     const Qualifier* findQualifier(std::string_view qualifier) const { return cim::findNamed(qualifiers, qualifier); }
-    bool isKey() const;
+    bool isKey() const { return isTrue(findQualifier("Key")); }
 
     /** Whether clients may modify it: its qualifier Write is true. */
-    bool isWritable() const;
+    bool isWritable() const { return isTrue(findQualifier("Write")); }
 };
 
 /** A method with its parameters; this host does not call methods. */
@@ -86,7 +89,7 @@ struct Class {
     const Property* findProperty(std::string_view property) const { return cim::findNamed(properties, property); }
     const Qualifier* findQualifier(std::string_view qualifier) const { return cim::findNamed(qualifiers, qualifier); }
     std::vector<const Property*> keys() const;
-    bool isAssociation() const;
+    bool isAssociation() const { return isTrue(findQualifier("Association")); }
 };
 
 /**
