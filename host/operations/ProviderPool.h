@@ -48,10 +48,7 @@ public:
     template <class Interface>
     Interface* get(const ProviderAddress& address);
 
-    /**
-     * Cleans up all providers and unloads the libraries that do not ask to stay. Must not be called while a request is
-     * running.
-     */
+    /** See ObjectManager::idle(). */
     void idle();
 
     /**
