@@ -7,7 +7,7 @@
 #include <string>
 #include <vector>
 
-#include "model/Name.h"
+#include "model/Value.h"
 
 namespace cimhost {
 
