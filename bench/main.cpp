@@ -33,7 +33,7 @@ bool run() {
 }  // namespace
 
 int main(int argc, char** argv) {
-    // Keep freed memory in the process; otherwise the kernel's work for it is measured with large responses.
+    // Keep freed memory in the process; otherwise the time of large responses includes the kernel's work for it.
     mallopt(M_TRIM_THRESHOLD, std::numeric_limits<int>::max());
     // Merge freed blocks at once; otherwise some request merges those of earlier ones.
     mallopt(M_MXFAST, 0);

@@ -191,7 +191,7 @@ def limits_table(limits):
 
 
 def draw(cases):
-    """Draws the time of some requests, of provider and baseline, over the number of records."""
+    """Plots the time of some requests, of provider and baseline, against the number of records."""
     columns = [cases[case] for case in PLOTTED]
     lines = []
     for size in sorted({size for by_size in columns for size in by_size}):

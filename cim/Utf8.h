@@ -32,7 +32,7 @@ inline Utf8Character firstCharacter(std::string_view string) {
     return {codePoint, static_cast<std::size_t>(end - head.begin()), true};
 }
 
-/** Whether a byte continues a UTF-8 character that an earlier byte begins. */
+/** Whether a byte is a UTF-8 continuation byte. */
 inline bool continuesCharacter(char byte) {
     return (static_cast<unsigned char>(byte) & 0xC0U) == 0x80U;
 }

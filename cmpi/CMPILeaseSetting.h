@@ -30,9 +30,7 @@ class CMPILeaseSetting : public SettingAdapter<LeaseSettingAdapterTraits> {
 public:
     using SettingAdapter::SettingAdapter;
 
-    /**
-     * Returns the path of a computer's lease, whether or not it exists; without keys if the computer's path has none.
-     */
+    /** See locateElement(). */
     CMPIObjectPath* locateLease(const CMPIObjectPath* computerPath) { return locateElement(computerPath); }
 };
 

@@ -32,10 +32,7 @@ class CMPIWarrantySetting : public SettingAdapter<WarrantySettingAdapterTraits> 
 public:
     using SettingAdapter::SettingAdapter;
 
-    /**
-     * Returns the path of a computer's warranty, whether or not it exists; without keys if the computer's path has
-     * none.
-     */
+    /** See locateElement(). */
     CMPIObjectPath* locateWarranty(const CMPIObjectPath* computerPath) { return locateElement(computerPath); }
 };
 

@@ -80,10 +80,9 @@ SettingAdapter<Traits>::operator bool() {
             return computer || element;
         case Mode::computerSource:
             return element;
-        case Mode::inert:
-            break;
+        default:
+            return false;
     }
-    return false;
 }
 
 template <class Traits>

@@ -119,7 +119,7 @@ constexpr std::size_t recordFileCount = 2;
 /** The record files of a data directory, whose name ends with a separator. */
 std::vector<RecordFile> recordFilesIn(const std::string& directory);
 
-/** One of them, by its name. */
+/** The record file of this name. */
 RecordFile recordFileIn(const std::string& directory, std::string_view fileName);
 
 }  // namespace durable

@@ -35,7 +35,7 @@ SavedCopies::Copy SavedCopies::parse(const std::string& content) const {
     Copy copy;
     std::string_view records = content;
     copy.isInUse = removeEnd(records, lastLineAfterNumber(true));
-    const bool hasHoles = content.find('\0') != std::string::npos;  // left by a file system that lost power
+    const bool hasHoles = content.find('\0') != std::string::npos;  // left by a power failure
     if (hasHoles || (!copy.isInUse && !removeEnd(records, lastLineAfterNumber(false)))) {
         return {};
     }

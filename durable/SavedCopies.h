@@ -19,7 +19,7 @@ public:
     struct Copy {
         std::string path{};
         std::string content{};     ///< without the last line; empty if there is no complete copy
-        std::uint64_t number = 0;  ///< one more than that of the copy before
+        std::uint64_t number = 0;  ///< one more than that of the preceding copy
         bool isInUse = false;      ///< whether a process may have begun another change since
     };
 

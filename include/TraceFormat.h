@@ -34,20 +34,26 @@ public:
         std::memset(buffer, 0, traceBufferSize);
     }
 
-    void append(const char* text) {
-        const char* shownText = text != nullptr ? text : "(null)";
-        append(shownText, std::strlen(shownText));
-    }
-
-    /** Formats the number as signed, so large numbers appear as negative. */
-    void append(unsigned int number) {
-        char digits[std::numeric_limits<int>::digits10 + 2];
-        append(digits, static_cast<std::size_t>(
-                           std::to_chars(digits, digits + sizeof digits, static_cast<int>(number)).ptr - digits));
+    /** Appends strings and numbers. */
+    template <class... Parts>
+    void append(Parts... parts) {
+        (appendPart(parts), ...);
     }
 
 private:
-    void append(const char* text, std::size_t length) {
+    void appendPart(const char* text) {
+        const char* shownText = text != nullptr ? text : "(null)";
+        appendCharacters(shownText, std::strlen(shownText));
+    }
+
+    /** Formats the number as signed, so large numbers appear as negative. */
+    void appendPart(unsigned int number) {
+        char digits[std::numeric_limits<int>::digits10 + 2];
+        const char* digitsEnd = std::to_chars(digits, digits + sizeof digits, static_cast<int>(number)).ptr;
+        appendCharacters(digits, static_cast<std::size_t>(digitsEnd - digits));
+    }
+
+    void appendCharacters(const char* text, std::size_t length) {
         const std::size_t taken = std::min(length, static_cast<std::size_t>(end - place));
         std::memcpy(place, text, taken);
         place += taken;
@@ -57,27 +63,18 @@ private:
     char* end;
 };
 
-/** Concatenates strings and numbers in the buffer and returns it. */
-template <class... Parts>
-static char* formatTrace(char (&buffer)[traceBufferSize], Parts... parts) {
-    TraceText text(buffer);
-    (text.append(parts), ...);
-    return buffer;
-}
-
 /** Appends the line of a function's entry, exit or call, or of a message. */
 [[maybe_unused]] static void appendCall(TraceText& text, const char* function, const char* file, unsigned int line,
                                         MessageType type) {
-    const auto append = [&](auto... parts) { (text.append(parts), ...); };
     switch (type) {
         case MT_EXITING:
-            return append("EXITING: ", function, "() in ", file, " [Line: ", line, "]");
+            return text.append("EXITING: ", function, "() in ", file, " [Line: ", line, "]");
         case MT_METHOD:
-            return append("METHOD: ", function, "() was invoked in ", file, " [Line: ", line, "]");
+            return text.append("METHOD: ", function, "() was invoked in ", file, " [Line: ", line, "]");
         case MT_MESSAGE:
-            return append("MESSAGE [File: ", file, ", Line: ", line, "]: ", function);
+            return text.append("MESSAGE [File: ", file, ", Line: ", line, "]: ", function);
         default:
-            return append("ENTERING: ", function, "() in ", file, " [Line: ", line, "]");
+            return text.append("ENTERING: ", function, "() in ", file, " [Line: ", line, "]");
     }
 }
 
@@ -98,21 +95,22 @@ static char* formatTrace(char (&buffer)[traceBufferSize], Parts... parts) {
     static char buffer[traceBufferSize];
     TraceText text(buffer);
     appendCall(text, function, file, line, type);
-    text.append(",Parameters List: ");
-    text.append(parameters);
+    text.append(",Parameters List: ", parameters);
     return buffer;
 }
 
 /** Formats the line with the value of a string variable. */
 [[maybe_unused]] static char* trace(const char* name, const char* file, unsigned int line, const char* value) {
     static char buffer[traceBufferSize];
-    return formatTrace(buffer, "VARIABLE: '", name, "' has Value '", value, "' at line ", line, " in ", file);
+    TraceText(buffer).append("VARIABLE: '", name, "' has Value '", value, "' at line ", line, " in ", file);
+    return buffer;
 }
 
 /** Formats the line with the value of a number. */
 [[maybe_unused]] static char* trace(const char* name, const char* file, unsigned int line, unsigned int value) {
     static char buffer[traceBufferSize];
-    return formatTrace(buffer, "VARIABLE: '", name, "' has Value '", value, "' at line ", line, " in ", file);
+    TraceText(buffer).append("VARIABLE: '", name, "' has Value '", value, "' at line ", line, " in ", file);
+    return buffer;
 }
 
 }  // namespace KO

@@ -2,13 +2,56 @@
 
 #include <cmpift.h>
 
-#include "AdapterContract.h"
+#include <string>
+#include <type_traits>
+#include <utility>
+
 #include "Dispatch.h"
 
 /**
  * Handlers of the operations. They pass the adapter's results to the object manager one by one and skip null pointers.
+ *
+ * There is one adapter per CIM class: a cursor over the instances that a request's object path selects, which
+ * translates between CMPI and the managed element.
+ *
+ * An entry point creates an adapter on its stack from (broker, context, object path). The adapter starts at the first
+ * selected instance, if any. Broker and context are borrowed. The returned paths and instances belong to the object
+ * manager, and are null if the broker cannot create them. Any operation may throw an exception derived from
+ * std::exception. So may the destructor, if a change cannot be written.
+ *
+ * Every adapter has:
+ *   operator bool()                  returns whether there is a current instance; for an association, whether to
+ *                                    continue the iteration
+ *   operator++()                     moves to the next instance
+ *   getObjectPath()                  returns the CMPIObjectPath* of the current instance
+ *   getCMPIInstance(properties)      returns the CMPIInstance* of the current instance
+ * Some have:
+ *   a constructor from (broker, context, namespace), which selects all instances
+ *   createCMPIInstance(path)         returns the CMPIInstance* of a new record with the path's key
+ *   modifyCMPIInstance(instance, properties)   writes the instance's modifiable properties
+ *   deleteCMPIInstance()             removes the current instance
+ *   getAssociatorNames()             returns the CMPIObjectPath* of the current associated object
+ *   getAssociator(properties)        returns the CMPIInstance* of the current associated object
+ * Property lists are traced but not applied.
  */
 namespace KO::LeaseWarrantyProvider::Handlers {
+
+template <class Adapter>
+using ObjectPathOf = decltype(std::declval<Adapter&>().getObjectPath());
+
+template <class Adapter>
+using InstanceOf = decltype(std::declval<Adapter&>().getCMPIInstance(std::declval<const char**>()));
+
+/** Whether a class has the operations of every adapter. */
+template <class Adapter>
+constexpr bool isAdapter =
+    std::is_constructible_v<Adapter, const CMPIBroker*, const CMPIContext*, const CMPIObjectPath*>&&
+        std::is_convertible_v<Adapter&, bool>&& std::is_same_v<ObjectPathOf<Adapter>, CMPIObjectPath*>&&
+            std::is_same_v<InstanceOf<Adapter>, CMPIInstance*>&& std::is_void_v<decltype(++std::declval<Adapter&>())>;
+
+/** Whether an adapter can be constructed from a namespace, for CreateInstance. */
+template <class Adapter>
+constexpr bool creates = std::is_constructible_v<Adapter, const CMPIBroker*, const CMPIContext*, std::string>;
 
 inline void give(const CMPIResult* result, const CMPIInstance* instance) {
     if (instance != nullptr) {
@@ -28,7 +71,7 @@ inline void give(const CMPIResult* result, const CMPIObjectPath* path) {
  */
 template <class Adapter, class Take>
 void walk(const Invocation& invocation, Take take) {
-    static_assert(AdapterContract::fulfilled<Adapter>);
+    static_assert(isAdapter<Adapter>);
     Adapter adapter(invocation.broker, invocation.context, invocation.path);
     while (adapter) {
         give(invocation.result, take(adapter));
@@ -60,7 +103,7 @@ void associatorNames(Invocation& invocation) {
 /** Takes the new record's key from the path. Returns the new instance, not its path. */
 template <class Adapter>
 void create(Invocation& invocation) {
-    static_assert(AdapterContract::creates<Adapter>);
+    static_assert(creates<Adapter>);
     Adapter adapter(invocation.broker, invocation.context, invocation.nameSpace);
     give(invocation.result, adapter.createCMPIInstance(invocation.path));
     invocation.result->ft->returnDone(invocation.result);

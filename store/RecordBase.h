@@ -8,7 +8,7 @@
 
 #include "FixedString.h"
 #include "IdentifierIndex.h"
-#include "RecordFields.h"
+#include "RecordStream.h"
 #include "Trace.h"
 
 namespace KO::LeaseWarrantyProvider {

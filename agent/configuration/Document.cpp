@@ -131,8 +131,4 @@ Document Document::parse(std::string_view text, const std::string& name) {
     return document;
 }
 
-TableReader Document::root(Problems& problems) const {
-    return TableReader(table.get(), "", problems);
-}
-
 }  // namespace Agent

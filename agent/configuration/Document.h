@@ -32,7 +32,7 @@ public:
     const std::string& problem() const { return whatIsWrong; }
 
     /** Returns a reader of the document. It must not outlive the document or the problems. */
-    TableReader root(Problems& problems) const;
+    TableReader root(Problems& problems) const { return TableReader(table.get(), "", problems); }
 
 private:
     std::shared_ptr<const TomlTable> table{};  ///< null for an empty document

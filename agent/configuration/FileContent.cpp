@@ -3,7 +3,6 @@
 #include <fcntl.h>
 #include <unistd.h>
 
-#include <cerrno>
 #include <system_error>
 
 namespace Agent {
@@ -32,10 +31,6 @@ int readRest(int file, std::string& text) {
         }
         text.append(block, static_cast<std::size_t>(count));
     }
-}
-
-bool FileContent::absent() const {
-    return error == ENOENT || error == ENOTDIR;
 }
 
 FileContent readFile(const std::string& path) {

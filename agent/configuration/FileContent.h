@@ -2,6 +2,7 @@
 
 #include <unistd.h>
 
+#include <cerrno>
 #include <string>
 #include <utility>
 
@@ -36,7 +37,7 @@ struct FileContent {
     int error = 0;  ///< errno value; 0 on success
 
     /** Whether the file does not exist, as opposed to one that cannot be read. */
-    bool absent() const;
+    bool absent() const { return error == ENOENT || error == ENOTDIR; }
 };
 
 /**

@@ -1,6 +1,7 @@
 #include "configuration/TableReader.h"
 
 #include <algorithm>
+#include <functional>
 #include <toml.hpp>
 
 namespace Agent {
@@ -12,24 +13,9 @@ const TomlTable& emptyTable() {
     return table;
 }
 
-bool isString(const TomlValue& value) {
-    return value.is_string();
-}
-
-bool isFlag(const TomlValue& value) {
-    return value.is_boolean();
-}
-
-bool isTable(const TomlValue& value) {
-    return value.is_table();
-}
-
-bool isArrayOfTables(const TomlValue& value) {
-    return value.is_array() && std::all_of(value.as_array().begin(), value.as_array().end(), isTable);
-}
-
-bool isArrayOfStrings(const TomlValue& value) {
-    return value.is_array() && std::all_of(value.as_array().begin(), value.as_array().end(), isString);
+template <bool (TomlValue::*hasType)() const noexcept>
+bool isArrayOf(const TomlValue& value) {
+    return value.is_array() && std::all_of(value.as_array().begin(), value.as_array().end(), std::mem_fn(hasType));
 }
 
 }  // namespace
@@ -46,19 +32,15 @@ const TomlValue* TableReader::find(std::string_view key) {
 template <class IsValid>
 const TomlValue* TableReader::find(std::string_view key, IsValid isValid, const std::string& requirement) {
     const TomlValue* value = find(key);
-    if (value != nullptr && !isValid(*value)) {
+    if (value != nullptr && !std::invoke(isValid, *value)) {
         reject(key, requirement);
         return nullptr;
     }
     return value;
 }
 
-bool TableReader::has(std::string_view key) {
-    return find(key) != nullptr;
-}
-
 std::optional<std::string> TableReader::string(std::string_view key) {
-    const TomlValue* value = find(key, isString, "must be a string");
+    const TomlValue* value = find(key, &TomlValue::is_string, "must be a string");
     return value != nullptr ? std::optional<std::string>(value->as_string().str) : std::nullopt;
 }
 
@@ -72,7 +54,7 @@ std::optional<std::string> TableReader::nonEmptyString(std::string_view key) {
 }
 
 std::optional<bool> TableReader::flag(std::string_view key) {
-    const TomlValue* value = find(key, isFlag, "must be true or false");
+    const TomlValue* value = find(key, &TomlValue::is_boolean, "must be true or false");
     return value != nullptr ? std::optional<bool>(value->as_boolean()) : std::nullopt;
 }
 
@@ -86,7 +68,7 @@ std::optional<std::int64_t> TableReader::number(std::string_view key, std::int64
 }
 
 std::optional<std::vector<std::string>> TableReader::strings(std::string_view key) {
-    const TomlValue* value = find(key, isArrayOfStrings, "must be an array of strings");
+    const TomlValue* value = find(key, isArrayOf<&TomlValue::is_string>, "must be an array of strings");
     if (value == nullptr) {
         return std::nullopt;
     }
@@ -98,13 +80,13 @@ std::optional<std::vector<std::string>> TableReader::strings(std::string_view ke
 }
 
 TableReader TableReader::table(std::string_view key) {
-    const TomlValue* value = find(key, isTable, "must be a table");
+    const TomlValue* value = find(key, &TomlValue::is_table, "must be a table");
     return TableReader(value != nullptr ? &value->as_table() : nullptr, nameOf(key), *problems);
 }
 
 std::vector<TableReader> TableReader::tables(std::string_view key) {
     std::vector<TableReader> readers;
-    const TomlValue* array = find(key, isArrayOfTables, "must be an array of tables");
+    const TomlValue* array = find(key, isArrayOf<&TomlValue::is_table>, "must be an array of tables");
     for (std::size_t index = 0; array != nullptr && index < array->as_array().size(); ++index) {
         const std::string name = nameOf(key) + "[" + std::to_string(index) + "]";
         readers.emplace_back(&array->as_array()[index].as_table(), name, *problems);

@@ -57,7 +57,7 @@ public:
     std::vector<std::pair<std::string, std::string>> allStrings();
 
     /** Returns whether the table has the key, with a value of any kind, and marks the key as known. */
-    bool has(std::string_view key);
+    bool has(std::string_view key) { return find(key) != nullptr; }
 
     /** Records a problem with the value of a key. */
     void reject(std::string_view key, const std::string& why);

@@ -80,8 +80,7 @@ bool isPlaceholder(const std::string& text) {
 }
 
 /**
- * Replaces runs of blanks, control characters and bytes that are not UTF-8 by one blank, and removes them at the
- * ends.
+ * Replaces runs of blanks, control characters and bytes that are not UTF-8 by one blank, and removes them at the ends.
  */
 std::string tidy(std::string_view text) {
     std::string tidied;

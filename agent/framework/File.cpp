@@ -114,8 +114,7 @@ private:
 };
 
 /**
- * Returns the file that a path resolves to; the path itself if there is none. Fails for a link that cannot be
- * resolved.
+ * Returns the file that a path resolves to; the path itself if there is none. Fails for a link that cannot be resolved.
  */
 std::string followLinks(const std::string& path) {
     std::error_code error;

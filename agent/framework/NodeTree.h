@@ -31,8 +31,7 @@ private:
 std::string hostName();
 
 /**
- * The nodes of this computer: the system, and below it the computer, both with its name, vendor and
- * product name.
+ * The nodes of this computer: the system, and below it the computer, both with its name, vendor and product name.
  * @param dmiRoot directory of the kernel's DMI files, ending with a separator
  * @param name    the computer's name
  * @param problems receives a sentence for each existing file that cannot be read

@@ -170,8 +170,8 @@ void writeIfAdmitted(const Record& record) noexcept {
 }
 
 /**
- * Whether a channel admits records of this level; true if that cannot be determined. Not inline, so that the usual
- * case, which does not come here, is cheap.
+ * Whether a channel admits records of this level; true if that cannot be determined. Not inline: most calls of
+ * admits() return before they need it.
  */
 [[gnu::noinline]] bool mayAdmit(const std::string& logger, int level) noexcept {
     const PreserveErrno preserveErrno;

@@ -10,9 +10,7 @@
 
 namespace cimhost {
 
-/**
- * Owns the encapsulated objects of one request on one thread, and frees them when it is destroyed. Thread-safe.
- */
+/** Owns the encapsulated objects of one request on one thread, and frees them when it is destroyed. Thread-safe. */
 class Arena {
 public:
     /**

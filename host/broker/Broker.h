@@ -2,16 +2,18 @@
 
 #include <cmpift.h>
 
+#include <cstddef>
+#include <cstdlib>
 #include <functional>
 #include <map>
 #include <memory>
 #include <mutex>
 #include <string>
+#include <unordered_map>
 
 #include "broker/Arena.h"
 #include "broker/ClassInfo.h"
 #include "broker/FunctionTables.h"
-#include "broker/MemoryBlocks.h"
 #include "model/Request.h"
 #include "model/Response.h"
 
@@ -47,6 +49,27 @@ struct BrokerOptions {
     std::function<void(const LogRecord&)> log{};  ///< none: records are discarded; may be called concurrently
     const FunctionTables* tables = nullptr;       ///< not owned; null: the standard tables
     bool hasMemoryTable = true;                   ///< whether the handle has a CMPIBrokerMemFT
+};
+
+/** Memory that providers allocate through the broker. The destructor frees the remaining blocks. Thread-safe. */
+class MemoryBlocks {
+public:
+    /** Allocates zeroed memory, at least one byte; null if out of memory. */
+    void* allocate(std::size_t count, std::size_t size);
+
+    /** Like realloc. Returns null and changes nothing if the pointer is not a block, or if out of memory. */
+    void* resize(void* block, std::size_t size);
+
+    /** Frees a block; ignores other pointers. */
+    void free(void* block);
+
+private:
+    struct Free {
+        void operator()(void* block) const { std::free(block); }
+    };
+
+    std::mutex mutex;
+    std::unordered_map<void*, std::unique_ptr<void, Free>> blocks;
 };
 
 /**

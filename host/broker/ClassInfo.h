@@ -7,13 +7,13 @@
 #include <string>
 #include <vector>
 
-#include "model/Name.h"
+#include "model/Value.h"
 
 namespace cimhost {
 
 class Schema;
 
-/** The facts of a property that the broker uses. */
+/** The part of a property's declaration that the broker uses. */
 struct PropertyInfo {
     Name name{};
     CMPIType type = CMPI_null;  ///< element type, without CMPI_ARRAY
@@ -22,7 +22,7 @@ struct PropertyInfo {
     std::string referenceClass{};  ///< of a reference, the class that it refers to; empty otherwise
 };
 
-/** The facts of a class that the broker uses: all properties, also inherited ones, and all superclasses. */
+/** The part of a class's declaration that the broker uses: all properties and superclasses, also inherited ones. */
 struct ClassInfo {
     std::string name{};
     std::vector<PropertyInfo> properties{};

@@ -1,9 +1,6 @@
 #include "broker/Convert.h"
 
-#include <algorithm>
-#include <iterator>
 #include <tuple>
-#include <type_traits>
 
 #include "broker/ErrorTranslation.h"
 
@@ -19,19 +16,10 @@ struct PlainType {
     void read(const CMPIValue& value, Scalar& scalar) const {
         scalar.emplace<Alternative>(static_cast<Alternative>(value.*member));
     }
-    void write(const Alternative& plain, CMPIValue& value) const { value.*member = static_cast<Member>(plain); }
     static bool holds(const Scalar& scalar) { return std::holds_alternative<Alternative>(scalar); }
-    void writeFrom(const Scalar& scalar, CMPIValue& value) const { write(std::get<Alternative>(scalar), value); }
-};
-
-template <>
-struct PlainType<Char16, CMPIChar16> {
-    CMPIType type;
-    CMPIChar16 CMPIValue::*member;
-
-    void read(const CMPIValue& value, Scalar& scalar) const { scalar = Char16{value.*member}; }
-    static bool holds(const Scalar& scalar) { return std::holds_alternative<Char16>(scalar); }
-    void writeFrom(const Scalar& scalar, CMPIValue& value) const { value.*member = std::get<Char16>(scalar).code; }
+    void writeFrom(const Scalar& scalar, CMPIValue& value) const {
+        value.*member = static_cast<Member>(std::get<Alternative>(scalar));
+    }
 };
 
 template <class Alternative, class Member>
@@ -137,6 +125,15 @@ Value arrayFrom(const CMPIArray* array, CMPIType type) {
     return Value::array(type, content.elements);
 }
 
+Value singleFrom(const CMPIValue* value, CMPIType type) {
+    Value converted{type, false, false, false, scalarFrom(value, type), {}};
+    converted.isNull = std::holds_alternative<std::monostate>(converted.single);
+    if (converted.isNull || type == CMPI_chars) {
+        converted.type = elementType(type);  // scalarFrom() accepts other values only if they have a valid type.
+    }
+    return converted;
+}
+
 }  // namespace
 
 CMPIType elementType(CMPIType type) {
@@ -165,19 +162,6 @@ Scalar scalarFrom(const CMPIValue* value, CMPIType type) {
     }
     return readPlain(*value, type);
 }
-
-namespace {
-
-Value singleFrom(const CMPIValue* value, CMPIType type) {
-    Value converted{type, false, false, false, scalarFrom(value, type), {}};
-    converted.isNull = std::holds_alternative<std::monostate>(converted.single);
-    if (converted.isNull || type == CMPI_chars) {
-        converted.type = elementType(type);  // scalarFrom() accepts other values only if they have a valid type.
-    }
-    return converted;
-}
-
-}  // namespace
 
 Value valueFrom(const CMPIValue* value, CMPIType type) {
     if (type == CMPI_null) {

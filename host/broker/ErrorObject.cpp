@@ -60,12 +60,9 @@ Strings stringsFrom(const CMPIArray* array) {
     return strings;
 }
 
-CMPIStatus setRecommendedActions(CMPIError* error, const CMPIArray* actions) {
-    return guarded([&] { content(error).recommendedActions = stringsFrom(actions); });
-}
-
-CMPIStatus setMessageArguments(CMPIError* error, CMPIArray* arguments) {
-    return guarded([&] { content(error).messageArguments = stringsFrom(arguments); });
+template <Strings ErrorInfo::*member, class Array>
+CMPIStatus setStrings(CMPIError* error, Array* array) {
+    return guarded([&] { content(error).*member = stringsFrom(array); });
 }
 
 }  // namespace
@@ -91,11 +88,11 @@ const CMPIErrorFT errorTable{tableVersion,
                              setPlain<&ErrorInfo::type>,
                              setString<&ErrorInfo::otherType>,
                              setString<&ErrorInfo::probableCauseDescription>,
-                             setRecommendedActions,
+                             setStrings<&ErrorInfo::recommendedActions, const CMPIArray>,
                              setString<&ErrorInfo::source>,
                              setPlain<&ErrorInfo::sourceFormat>,
                              setString<&ErrorInfo::otherSourceFormat>,
                              setString<&ErrorInfo::statusCodeDescription>,
-                             setMessageArguments};
+                             setStrings<&ErrorInfo::messageArguments, CMPIArray>};
 
 }  // namespace cimhost

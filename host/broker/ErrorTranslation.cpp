@@ -1,5 +1,7 @@
 #include "broker/ErrorTranslation.h"
 
+#include <exception>
+
 #include "broker/Arena.h"
 #include "broker/Broker.h"
 

@@ -3,7 +3,6 @@
 #include <cmpift.h>
 #include <cxxabi.h>
 
-#include <exception>
 #include <optional>
 #include <string>
 #include <utility>

@@ -6,9 +6,7 @@
 
 namespace cimhost {
 
-/**
- * All function tables of a broker and its objects. They must outlive the broker.
- */
+/** All function tables of a broker and its objects. They must outlive the broker. */
 struct FunctionTables {
     CMPIBrokerFT broker;
     CMPIBrokerEncFT encapsulation;

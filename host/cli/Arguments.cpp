@@ -81,7 +81,8 @@ constexpr Command commands[] = {
      "cimhost --schema my.mof classes"},
 };
 
-void addRepeatable(CLI::App& app, const char* option, std::vector<std::string>& values, const char* type,
+template <class Strings>
+void addRepeatable(CLI::App& app, const char* option, Strings& values, const char* type,
                    const std::string& description) {
     app.add_option(option, values, description + " (repeatable)")->type_name(type)->allow_extra_args(false);
 }
@@ -135,9 +136,7 @@ void addCommand(CLI::App& app, const Command& command, Arguments& arguments) {
         sub->add_option("--role", arguments.filter.role, "Role of the given instance")->type_name("NAME");
     }
     if ((command.options & lists) != 0) {
-        sub->add_option("--property", arguments.properties, "Request only this property (repeatable)")
-            ->type_name("NAME")
-            ->allow_extra_args(false);
+        addRepeatable(*sub, "--property", arguments.properties, "NAME", "Request only this property");
     }
     sub->callback([&arguments, &command] { arguments.operation = command.operation; });
 }

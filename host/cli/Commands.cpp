@@ -55,20 +55,12 @@ std::vector<ProviderRegistration> readRegistrations(const SearchPaths& paths) {
     return registrations;
 }
 
-std::string mofOf(const std::vector<Instance>& instances) {
-    std::string text;
-    for (const Instance& instance : instances) {
-        text += (text.empty() ? "" : "\n") + formatMof(instance);
-    }
-    return text;
-}
-
 std::string formatted(const std::vector<Instance>& instances, const Arguments& arguments) {
     switch (arguments.format) {
         case Format::json:
             return json::format(instances);
         case Format::mof:
-            return mofOf(instances);
+            return joined(instances, "\n", [](const Instance& each) { return formatMof(each); });
         default:
             return text::format(instances, arguments.style);
     }

@@ -13,6 +13,15 @@ using Json = nlohmann::ordered_json;
 Json pathJson(const ObjectPath& path);
 Json instanceJson(const Instance& instance);
 
+template <typename Convert, typename Item>
+Json listJson(const std::vector<Item>& items, Convert convert) {
+    Json list = Json::array();
+    for (const Item& item : items) {
+        list.push_back(convert(item));
+    }
+    return list;
+}
+
 struct ScalarJson {
     Json operator()(std::monostate) const { return nullptr; }
     Json operator()(Char16 value) const {
@@ -37,14 +46,8 @@ Json contentJson(const Value& value) {
     if (value.isNull) {
         return nullptr;
     }
-    if (!value.isArray) {
-        return std::visit(ScalarJson{}, value.single);
-    }
-    Json list = Json::array();
-    for (const Scalar& element : value.elements()) {
-        list.push_back(std::visit(ScalarJson{}, element));
-    }
-    return list;
+    const auto scalarJson = [](const Scalar& scalar) { return std::visit(ScalarJson{}, scalar); };
+    return value.isArray ? listJson(value.items, scalarJson) : scalarJson(value.single);
 }
 
 Json valueJson(const Value& value) {
@@ -69,15 +72,6 @@ Json pathJson(const ObjectPath& path) {
 
 Json instanceJson(const Instance& instance) {
     return {{"path", pathJson(instance.path)}, {"properties", namedJson(instance.properties)}};
-}
-
-template <typename Convert, typename Item>
-Json listJson(const std::vector<Item>& items, Convert convert) {
-    Json list = Json::array();
-    for (const Item& item : items) {
-        list.push_back(convert(item));
-    }
-    return list;
 }
 
 Json stringOrNull(const std::string& string) {
@@ -105,17 +99,14 @@ struct EventJson {
 };
 
 Json responseJson(const ProviderResponse& response) {
-    Json returned = Json::array();
-    for (const ResultEvent& event : response.events) {
-        returned.push_back(std::visit(EventJson{}, event));
-    }
+    const auto eventJson = [](const ResultEvent& event) { return std::visit(EventJson{}, event); };
     const bool hasMessage = response.hasMessage || response.threw;
     return {{"status",
              {{"code", static_cast<int>(response.status.rc)},
               {"name", codeName(response.status.rc)},
               {"message", hasMessage ? Json(response.status.message) : Json(nullptr)}}},
             {"exception", response.threw},
-            {"returned", returned},
+            {"returned", listJson(response.events, eventJson)},
             {"returnDoneCount", response.doneCount()}};
 }
 

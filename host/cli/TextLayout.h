@@ -9,14 +9,19 @@
 
 namespace cimhost {
 
-/** Joins the words with the separator. */
-inline std::string joined(const std::vector<std::string>& words, std::string_view separator) {
+/** Joins the strings that a function returns for the items, with the separator between them. */
+template <class Item, class Function>
+std::string joined(const std::vector<Item>& items, std::string_view separator, Function stringOf) {
     std::string list;
-    for (const std::string& word : words) {
+    for (const Item& item : items) {
         list += list.empty() ? "" : std::string(separator);
-        list += word;
+        list += stringOf(item);
     }
     return list;
+}
+
+inline std::string joined(const std::vector<std::string>& words, std::string_view separator) {
+    return joined(words, separator, [](const std::string& word) -> const std::string& { return word; });
 }
 
 }  // namespace cimhost

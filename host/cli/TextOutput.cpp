@@ -75,11 +75,7 @@ Row providerRow(const ListedClass& listed, const ProviderRegistration& provider)
 }  // namespace
 
 std::string format(const std::vector<Instance>& instances, const Style& style) {
-    std::string text;
-    for (const Instance& instance : instances) {
-        text += (text.empty() ? "" : "\n") + instanceText(instance, "", style);
-    }
-    return text;
+    return joined(instances, "\n", [&](const Instance& each) { return instanceText(each, "", style); });
 }
 
 std::string format(const std::vector<ObjectPath>& paths, const Style& style) {
@@ -91,11 +87,7 @@ std::string format(const std::vector<ObjectPath>& paths, const Style& style) {
 }
 
 std::string format(const std::vector<ProviderResponse>& responses, const Style& style) {
-    std::string text;
-    for (const ProviderResponse& response : responses) {
-        text += (text.empty() ? "" : "\n") + responseText(response, style);
-    }
-    return text;
+    return joined(responses, "\n", [&](const ProviderResponse& each) { return responseText(each, style); });
 }
 
 std::string format(const std::vector<ListedClass>& classes, const Style& style) {

@@ -69,20 +69,57 @@ struct Request {
 
     /** @name One function per operation */
     ///@{
-    static Request enumerateInstances(ObjectPath path, PropertyList properties = {});
-    static Request enumerateInstanceNames(ObjectPath path);
-    static Request getInstance(ObjectPath path, PropertyList properties = {});
-    static Request createInstance(ObjectPath path, Instance instance);
-    static Request modifyInstance(ObjectPath path, Instance instance, PropertyList properties = {});
-    static Request deleteInstance(ObjectPath path);
-    static Request execQuery(ObjectPath path, std::string language, std::string query);
-    static Request associators(ObjectPath path, AssociationFilter filter, PropertyList properties = {});
-    static Request associatorNames(ObjectPath path, AssociationFilter filter);
-    static Request references(ObjectPath path, AssociationFilter filter, PropertyList properties = {});
-    static Request referenceNames(ObjectPath path, AssociationFilter filter);
-    static Request invokeMethod(ObjectPath path, std::string method, std::vector<NamedValue> input);
-    static Request setProperty(ObjectPath path, std::string property, Value value);
-    static Request getProperty(ObjectPath path, std::string property);
+    static Request enumerateInstances(ObjectPath path, PropertyList properties = {}) {
+        return {Operation::enumerateInstances, std::move(path), std::move(properties)};
+    }
+    static Request enumerateInstanceNames(ObjectPath path) {
+        return {Operation::enumerateInstanceNames, std::move(path)};
+    }
+    static Request getInstance(ObjectPath path, PropertyList properties = {}) {
+        return {Operation::getInstance, std::move(path), std::move(properties)};
+    }
+    static Request createInstance(ObjectPath path, Instance instance) {
+        return {Operation::createInstance, std::move(path), {}, std::move(instance)};
+    }
+    static Request modifyInstance(ObjectPath path, Instance instance, PropertyList properties = {}) {
+        return {Operation::modifyInstance, std::move(path), std::move(properties), std::move(instance)};
+    }
+    static Request deleteInstance(ObjectPath path) { return {Operation::deleteInstance, std::move(path)}; }
+    static Request execQuery(ObjectPath path, std::string language, std::string query) {
+        Request request{Operation::execQuery, std::move(path)};
+        request.language = std::move(language);
+        request.query = std::move(query);
+        return request;
+    }
+    static Request associators(ObjectPath path, AssociationFilter filter, PropertyList properties = {}) {
+        return {Operation::associators, std::move(path), std::move(properties), {}, std::move(filter)};
+    }
+    static Request associatorNames(ObjectPath path, AssociationFilter filter) {
+        return {Operation::associatorNames, std::move(path), {}, {}, std::move(filter)};
+    }
+    static Request references(ObjectPath path, AssociationFilter filter, PropertyList properties = {}) {
+        return {Operation::references, std::move(path), std::move(properties), {}, std::move(filter)};
+    }
+    static Request referenceNames(ObjectPath path, AssociationFilter filter) {
+        return {Operation::referenceNames, std::move(path), {}, {}, std::move(filter)};
+    }
+    static Request invokeMethod(ObjectPath path, std::string method, std::vector<NamedValue> input) {
+        Request request{Operation::invokeMethod, std::move(path)};
+        request.member = std::move(method);
+        request.input = std::move(input);
+        return request;
+    }
+    static Request setProperty(ObjectPath path, std::string property, Value value) {
+        Request request{Operation::setProperty, std::move(path)};
+        request.member = std::move(property);
+        request.value = std::move(value);
+        return request;
+    }
+    static Request getProperty(ObjectPath path, std::string property) {
+        Request request{Operation::getProperty, std::move(path)};
+        request.member = std::move(property);
+        return request;
+    }
     ///@}
 
     /** Returns the same request with this context. */

@@ -4,15 +4,15 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <iosfwd>
 #include <memory>
 #include <optional>
 #include <string>
 #include <string_view>
+#include <type_traits>
 #include <utility>
 #include <variant>
 #include <vector>
-
-#include "model/Name.h"
 
 namespace cimhost {
 
@@ -27,12 +27,13 @@ struct DateTime {
 /** One 16-bit character. */
 struct Char16 {
     std::uint16_t code = 0;
+
+    Char16() = default;
+    explicit Char16(std::uint16_t itsCode) : code(itsCode) {}
+    explicit operator std::uint16_t() const { return code; }
 };
 
-/**
- * A single CIM value. std::monostate is the null value. References and embedded instances are
- * shared and immutable.
- */
+/** A single CIM value. std::monostate is the null value. References and embedded instances are shared and immutable. */
 using Scalar = std::variant<std::monostate, bool, Char16, std::uint8_t, std::uint16_t, std::uint32_t, std::uint64_t,
                             std::int8_t, std::int16_t, std::int32_t, std::int64_t, float, double, std::string, DateTime,
                             std::shared_ptr<const ObjectPath>, std::shared_ptr<const Instance>>;
@@ -99,6 +100,41 @@ struct Value {
     static Value stringWithoutCharacters();
     static Value nullStringObject();
     ///@}
+};
+
+/**
+ * The name of a key, a property or a parameter, with the letter case that its author used. Copies share its characters.
+ * Most names are those that classes declare: these are stored once in the process, and never counted or freed.
+ */
+class Name {
+public:
+    Name() = default;
+    Name(std::string itsName) : shared(std::make_shared<const std::string>(std::move(itsName))) {}
+    Name(const char* itsName) : Name(std::string(itsName)) {}
+
+    /** The same name as one that the process keeps. Only for names of classes, since it never frees them. */
+    static Name declared(const std::string& name);
+
+    const std::string& string() const {
+        static const std::string empty;
+        return shared == nullptr ? empty : *shared;
+    }
+    operator const std::string&() const { return string(); }
+    operator std::string_view() const { return string(); }
+
+    template <class Other>
+    friend std::enable_if_t<std::is_convertible_v<const Other&, std::string_view>, bool> operator==(
+        const Name& left, const Other& right) {
+        return std::string_view(left) == std::string_view(right);
+    }
+    template <class Other>
+    friend auto operator!=(const Name& left, const Other& right) -> decltype(!(left == right)) {
+        return !(left == right);
+    }
+    friend std::ostream& operator<<(std::ostream& stream, const Name& name);
+
+private:
+    std::shared_ptr<const std::string> shared{};  ///< null: empty
 };
 
 /** A named value: a key of an object path or a property of an instance. */

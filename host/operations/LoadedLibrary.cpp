@@ -47,8 +47,4 @@ LoadedLibrary::~LoadedLibrary() {
     }
 }
 
-void* LoadedLibrary::symbol(const std::string& name) const {
-    return dlsym(handle, name.c_str());
-}
-
 }  // namespace cimhost

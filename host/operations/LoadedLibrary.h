@@ -52,7 +52,7 @@ public:
     /** Returns a function of the library; null if it does not export the name. */
     template <class Function>
     Function* function(const std::string& name) const {
-        return reinterpret_cast<Function*>(symbol(name));
+        return reinterpret_cast<Function*>(dlsym(handle, name.c_str()));
     }
 
     const std::filesystem::path& file() const { return libraryFile; }
@@ -61,8 +61,6 @@ public:
     void keep() { staysLoaded = true; }
 
 private:
-    void* symbol(const std::string& name) const;
-
     std::filesystem::path libraryFile;
     void* handle;
     bool staysLoaded = false;

@@ -67,8 +67,6 @@ ObjectManager::ObjectManager(ObjectManagerOptions itsOptions, ProviderRegistry i
                  behaviour.hasMemoryTable()}),
       pool(itsBroker, std::move(itsOptions.libraries), policy) {}
 
-ObjectManager::~ObjectManager() = default;
-
 void ObjectManager::completeContext(Request& request) const {
     for (const NamedValue& entry : baseContext) {
         addIfMissing(request.context, entry.name, entry.value);

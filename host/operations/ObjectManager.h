@@ -37,7 +37,6 @@ struct ObjectManagerOptions {
 class ObjectManager : public UpCalls {
 public:
     ObjectManager(ObjectManagerOptions itsOptions, ProviderRegistry itsRegistry);
-    ~ObjectManager() override;
 
     /**
      * Performs a request. The provider receives the instance of a creation or modification with exactly its properties.

@@ -28,17 +28,6 @@ private:
 
 }  // namespace
 
-ProviderPool::ProviderPool(Broker& itsBroker, LibraryOptions itsOptions, const ProviderPolicy& itsPolicy)
-    : broker(itsBroker), options(std::move(itsOptions)), policy(itsPolicy) {}
-
-ProviderPool::~ProviderPool() {
-    stop();
-}
-
-ProviderPool::InUse::InUse(ProviderPool& itsPool) : pool(itsPool) {
-    ++pool.uses;
-}
-
 ProviderPool::InUse::~InUse() {
     if (--pool.uses == 0) {
         pool.unloadCrashed();

@@ -7,6 +7,7 @@
 #include <mutex>
 #include <set>
 #include <string>
+#include <utility>
 
 #include "operations/Interfaces.h"
 #include "operations/LoadedLibrary.h"
@@ -25,15 +26,16 @@ constexpr const char* stoppingMessage = "The object manager is stopping.";
  */
 class ProviderPool {
 public:
-    ProviderPool(Broker& itsBroker, LibraryOptions itsOptions, const ProviderPolicy& itsPolicy);
-    ~ProviderPool();
+    ProviderPool(Broker& itsBroker, LibraryOptions itsOptions, const ProviderPolicy& itsPolicy)
+        : broker(itsBroker), options(std::move(itsOptions)), policy(itsPolicy) {}
+    ~ProviderPool() { stop(); }
     ProviderPool(const ProviderPool&) = delete;
     ProviderPool& operator=(const ProviderPool&) = delete;
 
     /** Marks the pool as used by a request, for its lifetime. Requests may be nested. */
     class InUse {
     public:
-        explicit InUse(ProviderPool& itsPool);
+        explicit InUse(ProviderPool& itsPool) : pool(itsPool) { ++pool.uses; }
         ~InUse();
         InUse(const InUse&) = delete;
         InUse& operator=(const InUse&) = delete;
@@ -46,10 +48,7 @@ public:
     template <class Interface>
     Interface* get(const ProviderAddress& address);
 
-    /**
-     * Cleans up all providers and unloads the libraries that do not ask to stay. Must not be called while a request is
-     * running.
-     */
+    /** See ObjectManager::idle(). */
     void idle();
 
     /**

@@ -33,13 +33,10 @@ void ProviderRegistry::add(const ProviderRegistration& registration) {
 }
 
 void ProviderRegistry::add(ServedClass entry) {
-    const auto same = std::find_if(entries.begin(), entries.end(), [&](const ServedClass& each) {
-        return each.kind == entry.kind && isIn(each, entry.nameSpace) && cim::sameName(each.className, entry.className);
-    });
-    if (same == entries.end()) {
-        entries.push_back(std::move(entry));
+    if (const ServedClass* same = find(entry.nameSpace, entry.className, entry.kind)) {
+        entries[static_cast<std::size_t>(same - entries.data())] = std::move(entry);
     } else {
-        *same = std::move(entry);
+        entries.push_back(std::move(entry));
     }
 }
 

@@ -1,6 +1,5 @@
 #include "schema/Literal.h"
 
-#include <cfloat>
 #include <cmath>
 #include <limits>
 
@@ -141,34 +140,6 @@ struct LiteralKind {
     CMPIType operator()(const std::string&) const { return CMPI_string; }
 };
 
-}  // namespace
-
-Scalar typedScalar(const Literal& literal, CMPIType type) {
-    if (std::holds_alternative<std::monostate>(literal.value)) {
-        return std::monostate{};
-    }
-    for (const Converter& converter : converters) {
-        if (converter.type == type) {
-            return converter.convert(literal, type);
-        }
-    }
-    refuse(literal, type, "a value of this type cannot be written as a constant");
-}
-
-Scalar typedElement(const Literal& literal, const Property& property, const Schema& schema,
-                    const std::string& defaultNameSpace) {
-    if (property.type == CMPI_ref && !std::holds_alternative<std::monostate>(literal.value)) {
-        return referenceFrom(literal, property, schema, defaultNameSpace);
-    }
-    return typedScalar(literal, property.type);
-}
-
-CMPIType literalType(const Literal& literal) {
-    return std::visit(LiteralKind{}, literal.value);
-}
-
-namespace {
-
 /** The literal of a value without quotation marks. */
 Literal plainLiteral(std::string_view source, const Property& property) {
     if (property.type == CMPI_char16) {
@@ -211,6 +182,30 @@ Value parseValue(std::string_view source, const Property& property, const Schema
 }
 
 }  // namespace
+
+Scalar typedScalar(const Literal& literal, CMPIType type) {
+    if (std::holds_alternative<std::monostate>(literal.value)) {
+        return std::monostate{};
+    }
+    for (const Converter& converter : converters) {
+        if (converter.type == type) {
+            return converter.convert(literal, type);
+        }
+    }
+    refuse(literal, type, "a value of this type cannot be written as a constant");
+}
+
+Scalar typedElement(const Literal& literal, const Property& property, const Schema& schema,
+                    const std::string& defaultNameSpace) {
+    if (property.type == CMPI_ref && !std::holds_alternative<std::monostate>(literal.value)) {
+        return referenceFrom(literal, property, schema, defaultNameSpace);
+    }
+    return typedScalar(literal, property.type);
+}
+
+CMPIType literalType(const Literal& literal) {
+    return std::visit(LiteralKind{}, literal.value);
+}
 
 Value parsePropertyValue(std::string_view source, const Property& property, const Schema& schema,
                          const std::string& defaultNameSpace) {

@@ -1,7 +1,6 @@
 #include "schema/LiteralGrammar.h"
 
 #include <charconv>
-#include <cmath>
 #include <limits>
 #include <locale>
 #include <sstream>

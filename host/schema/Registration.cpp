@@ -1,6 +1,5 @@
 #include "schema/Registration.h"
 
-#include <algorithm>
 #include <fstream>
 #include <sstream>
 

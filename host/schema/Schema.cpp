@@ -8,14 +8,6 @@ namespace {
 
 using cim::findNamed;
 
-bool isTrue(const Qualifier* qualifier) {
-    if (qualifier == nullptr || qualifier->value.isNull) {
-        return false;
-    }
-    const bool* value = std::get_if<bool>(&qualifier->value.single);
-    return value != nullptr && *value;
-}
-
 void inheritQualifiers(std::vector<Qualifier>& own, const std::vector<Qualifier>& inherited) {
     for (const Qualifier& qualifier : inherited) {
         if (qualifier.flavor.toSubclass && findNamed(own, qualifier.name) == nullptr) {
@@ -43,14 +35,10 @@ void checkOverride(const Class& declared, const Property& own, const Property& i
     }
 }
 
-template <typename Element>
-void checkUnique(const Class& declared, const std::vector<Element>& elements, const char* kind) {
-    for (std::size_t i = 0; i < elements.size(); ++i) {
-        for (std::size_t j = 0; j < i; ++j) {
-            if (cim::sameName(elements[i].name, elements[j].name)) {
-                throw std::invalid_argument("class " + declared.name + " declares the " + kind + " " +
-                                            elements[i].name + " twice");
-            }
+void checkUnique(const Class& declared) {
+    for (const Property& each : declared.properties) {
+        if (findNamed(declared.properties, each.name) != &each) {
+            throw std::invalid_argument("class " + declared.name + " declares the property " + each.name + " twice");
         }
     }
 }
@@ -62,9 +50,8 @@ std::vector<Property> mergeProperties(const Class& declared, const Class& super)
         markPropagated(inherited.qualifiers);
     }
     for (const Property& own : declared.properties) {
-        const auto inherited = std::find_if(merged.begin(), merged.end(),
-                                            [&](const Property& each) { return cim::sameName(each.name, own.name); });
-        if (inherited == merged.end()) {
+        Property* inherited = findNamed(merged, own.name);
+        if (inherited == nullptr) {
             merged.push_back(own);
             continue;
         }
@@ -79,9 +66,7 @@ std::vector<Property> mergeProperties(const Class& declared, const Class& super)
 std::vector<Method> mergeMethods(const Class& declared, const Class& super) {
     std::vector<Method> merged = declared.methods;
     for (const Method& inherited : super.methods) {
-        const auto overriding = std::find_if(
-            merged.begin(), merged.end(), [&](const Method& own) { return cim::sameName(own.name, inherited.name); });
-        if (overriding != merged.end()) {
+        if (Method* overriding = findNamed(merged, inherited.name)) {
             inheritQualifiers(overriding->qualifiers, inherited.qualifiers);
             continue;
         }
@@ -93,24 +78,12 @@ std::vector<Method> mergeMethods(const Class& declared, const Class& super) {
 
 }  // namespace
 
-const Qualifier* Property::findQualifier(std::string_view qualifier) const {
-    return findNamed(qualifiers, qualifier);
-}
-
-bool Property::isKey() const {
-    return isTrue(findQualifier("Key"));
-}
-
-bool Property::isWritable() const {
-    return isTrue(findQualifier("Write"));
-}
-
-const Property* Class::findProperty(std::string_view property) const {
-    return findNamed(properties, property);
-}
-
-const Qualifier* Class::findQualifier(std::string_view qualifier) const {
-    return findNamed(qualifiers, qualifier);
+bool isTrue(const Qualifier* qualifier) {
+    if (qualifier == nullptr || qualifier->value.isNull) {
+        return false;
+    }
+    const bool* value = std::get_if<bool>(&qualifier->value.single);
+    return value != nullptr && *value;
 }
 
 std::vector<const Property*> Class::keys() const {
@@ -123,10 +96,6 @@ std::vector<const Property*> Class::keys() const {
     return found;
 }
 
-bool Class::isAssociation() const {
-    return isTrue(findQualifier("Association"));
-}
-
 Schema::Schema() {
     for (QualifierDeclaration& declaration : standardQualifiers()) {
         qualifierDeclarations.emplace(declaration.name, declaration);
@@ -136,10 +105,6 @@ Schema::Schema() {
 const Class* Schema::findClass(std::string_view name) const {
     const auto found = byName.find(name);
     return found == byName.end() ? nullptr : found->second.get();
-}
-
-std::vector<const Class*> Schema::classes() const {
-    return inOrder;
 }
 
 bool Schema::isA(std::string_view name, std::string_view ancestor) const {
@@ -161,7 +126,7 @@ const Class& Schema::add(Class declared) {
     if (findClass(declared.name) != nullptr) {
         throw std::invalid_argument("class " + declared.name + " is declared a second time");
     }
-    checkUnique(declared, declared.properties, "property");
+    checkUnique(declared);
     for (Property& property : declared.properties) {
         property.origin = declared.name;
     }

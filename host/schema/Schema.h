@@ -28,6 +28,9 @@ struct Qualifier {
     bool isPropagated = false;  ///< inherited from a superclass, not declared
 };
 
+/** Whether a qualifier exists and is true. */
+bool isTrue(const Qualifier* qualifier);
+
 /** Kinds of elements that a qualifier may qualify, as CIM-XML names them. */
 constexpr std::array<std::string_view, 7> scopeNames{"CLASS",  "ASSOCIATION", "REFERENCE", "PROPERTY",
                                                      "METHOD", "PARAMETER",   "INDICATION"};
@@ -59,11 +62,11 @@ struct Property {
     std::vector<Qualifier> qualifiers{};
     std::string origin{};  ///< name of the class that declares it
 
-    const Qualifier* findQualifier(std::string_view qualifier) const;
-    bool isKey() const;
+    const Qualifier* findQualifier(std::string_view qualifier) const { return cim::findNamed(qualifiers, qualifier); }
+    bool isKey() const { return isTrue(findQualifier("Key")); }
 
     /** Whether clients may modify it: its qualifier Write is true. */
-    bool isWritable() const;
+    bool isWritable() const { return isTrue(findQualifier("Write")); }
 };
 
 /** A method with its parameters; this host does not call methods. */
@@ -83,10 +86,10 @@ struct Class {
     std::vector<Property> properties{};
     std::vector<Method> methods{};
 
-    const Property* findProperty(std::string_view property) const;
-    const Qualifier* findQualifier(std::string_view qualifier) const;
+    const Property* findProperty(std::string_view property) const { return cim::findNamed(properties, property); }
+    const Qualifier* findQualifier(std::string_view qualifier) const { return cim::findNamed(qualifiers, qualifier); }
     std::vector<const Property*> keys() const;
-    bool isAssociation() const;
+    bool isAssociation() const { return isTrue(findQualifier("Association")); }
 };
 
 /**
@@ -102,7 +105,7 @@ public:
     const Class* findClass(std::string_view name) const;
 
     /** All classes in the order in which they were added. */
-    std::vector<const Class*> classes() const;
+    const std::vector<const Class*>& classes() const { return inOrder; }
 
     /** Whether a class is the ancestor or derived from it. An unknown class has no ancestors. */
     bool isA(std::string_view name, std::string_view ancestor) const;

@@ -9,7 +9,7 @@
 
 namespace cimhost::lab {
 
-/** The facts of a class that a load uses. The schema must outlive it. */
+/** The part of a class's declaration that a load uses. The schema must outlive it. */
 struct LoadClass {
     ObjectPath path{};                          ///< of the class
     std::string key{};                          ///< the only key, a string
