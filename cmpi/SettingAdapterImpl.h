@@ -80,9 +80,10 @@ SettingAdapter<Traits>::operator bool() {
             return computer || element;
         case Mode::computerSource:
             return element;
-        default:
-            return false;
+        case Mode::inert:
+            break;
     }
+    return false;
 }
 
 template <class Traits>
