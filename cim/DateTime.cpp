@@ -1,11 +1,10 @@
 #include "cim/DateTime.h"
 
 #include <algorithm>
-#include <chrono>
 #include <cstdio>
 #include <ctime>
 #include <initializer_list>
-#include <utility>
+#include <optional>
 
 namespace cim {
 namespace {
@@ -72,28 +71,6 @@ bool isTimeOfDay(std::string_view string) {
            within(string.substr(4, 2), 0, 59);
 }
 
-constexpr std::int64_t microsecondsInSecond = 1'000'000;
-
-int fieldAt(const std::string& dateTime, std::size_t position, std::size_t length) {
-    return std::stoi(dateTime.substr(position, length));
-}
-
-std::int64_t secondsOfInterval(const std::string& dateTime) {
-    const std::int64_t hours = std::int64_t{24} * fieldAt(dateTime, 0, 8) + fieldAt(dateTime, 8, 2);
-    return (60 * hours + fieldAt(dateTime, 10, 2)) * 60 + fieldAt(dateTime, 12, 2);
-}
-
-std::int64_t secondsOfTime(const std::string& dateTime) {
-    std::tm time{};
-    time.tm_year = fieldAt(dateTime, 0, 4) - 1900;
-    time.tm_mon = fieldAt(dateTime, 4, 2) - 1;
-    time.tm_mday = fieldAt(dateTime, 6, 2);
-    time.tm_hour = fieldAt(dateTime, 8, 2);
-    time.tm_min = fieldAt(dateTime, 10, 2);
-    time.tm_sec = fieldAt(dateTime, 12, 2);
-    return std::int64_t{timegm(&time)} - std::int64_t{60} * fieldAt(dateTime, 21, 4);
-}
-
 }  // namespace
 
 bool isDateTime(std::string_view string) {
@@ -119,10 +96,6 @@ bool isPointInTime(std::string_view string) {
     return isDateTime(string) && string[21] != ':' && string.find('*') == std::string_view::npos;
 }
 
-bool isIntervalForm(std::string_view dateTime) {
-    return dateTime.size() == noDate.size() && dateTime[21] == ':';
-}
-
 bool isInterval(std::string_view string) {
     return isDateTime(string) && string[21] == ':' && string.find('*') == std::string_view::npos;
 }
@@ -143,42 +116,6 @@ std::string formatPointInTime(std::int64_t seconds, int offset, int microseconds
                       fields.tm_mon + 1, fields.tm_mday, fields.tm_hour, fields.tm_min, fields.tm_sec, microseconds,
                       offset < 0 ? '-' : '+', offset < 0 ? -offset : offset);
     return {string, static_cast<std::size_t>(length)};
-}
-
-std::optional<std::int64_t> microsecondsOf(const std::string& dateTime) {
-    if (dateTime.size() != noDate.size() || dateTime.find('*') != std::string::npos) {
-        return std::nullopt;
-    }
-    const std::int64_t seconds = isIntervalForm(dateTime) ? secondsOfInterval(dateTime) : secondsOfTime(dateTime);
-    return seconds * microsecondsInSecond + fieldAt(dateTime, 15, 6);
-}
-
-std::optional<std::string> formatTime(std::int64_t microseconds) {
-    std::int64_t fraction = microseconds % microsecondsInSecond;
-    if (fraction < 0) {
-        fraction += microsecondsInSecond;
-    }
-    const std::int64_t seconds = (microseconds - fraction) / microsecondsInSecond;
-    std::string formatted = formatPointInTime(seconds, 0, static_cast<int>(fraction));
-    return formatted.empty() ? std::nullopt : std::optional(std::move(formatted));
-}
-
-std::optional<std::string> formatInterval(std::uint64_t microseconds) {
-    const std::uint64_t seconds = microseconds / microsecondsInSecond;
-    const std::uint64_t days = seconds / 86400;
-    if (days > 99'999'999) {
-        return std::nullopt;
-    }
-    char formatted[64];
-    std::snprintf(formatted, sizeof formatted, "%08u%02u%02u%02u.%06u:000", static_cast<unsigned>(days),
-                  static_cast<unsigned>(seconds / 3600 % 24), static_cast<unsigned>(seconds / 60 % 60),
-                  static_cast<unsigned>(seconds % 60), static_cast<unsigned>(microseconds % microsecondsInSecond));
-    return formatted;
-}
-
-std::string formatCurrentTime() {
-    const auto now = std::chrono::system_clock::now().time_since_epoch();
-    return formatTime(std::chrono::duration_cast<std::chrono::microseconds>(now).count()).value_or(std::string{});
 }
 
 }  // namespace cim

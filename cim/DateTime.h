@@ -1,7 +1,6 @@
 #pragma once
 
 #include <cstdint>
-#include <optional>
 #include <string>
 #include <string_view>
 
@@ -34,24 +33,5 @@ bool isInterval(std::string_view string);
  * @return empty if the year is not in 0 to 9999 or the offset exceeds 999 minutes
  */
 std::string formatPointInTime(std::int64_t seconds, int offset, int microseconds = 0);
-
-/** Whether a CIM datetime, with asterisks or without, is an interval. */
-bool isIntervalForm(std::string_view dateTime);
-
-/**
- * Microseconds since 1970-01-01 00:00 UTC, or of the interval; negative before 1970. None if fields are unknown
- * (asterisks).
- * @param dateTime a valid CIM datetime
- */
-std::optional<std::int64_t> microsecondsOf(const std::string& dateTime);
-
-/** A point in time as CIM datetime in UTC; none if the year is not in 0 to 9999. */
-std::optional<std::string> formatTime(std::int64_t microseconds);
-
-/** An interval as CIM datetime; none if its days have more than eight digits. */
-std::optional<std::string> formatInterval(std::uint64_t microseconds);
-
-/** The current time as CIM datetime in UTC. */
-std::string formatCurrentTime();
 
 }  // namespace cim

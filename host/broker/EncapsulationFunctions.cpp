@@ -2,6 +2,7 @@
 
 #include "broker/Broker.h"
 #include "broker/Convert.h"
+#include "broker/DateTimes.h"
 #include "broker/ErrorTranslation.h"
 #include "broker/FunctionTables.h"
 #include "broker/NamedValues.h"
@@ -75,14 +76,14 @@ CMPIArray* newArray(const CMPIBroker* broker, CMPICount size, CMPIType type, CMP
 
 CMPIDateTime* newDateTime(const CMPIBroker* broker, CMPIStatus* rc) {
     return guarded<CMPIDateTime*>(rc, nullptr,
-                                  [&] { return arenaOf(broker).make<CMPIDateTime>({cim::formatCurrentTime()}); });
+                                  [&] { return arenaOf(broker).make<CMPIDateTime>({formatCurrentTime()}); });
 }
 
 CMPIDateTime* newDateTimeFromBinary(const CMPIBroker* broker, CMPIUint64 microseconds, CMPIBoolean interval,
                                     CMPIStatus* rc) {
     return guarded<CMPIDateTime*>(rc, nullptr, [&] {
-        std::optional<std::string> formatted = interval != 0 ? cim::formatInterval(microseconds)
-                                                             : cim::formatTime(static_cast<std::int64_t>(microseconds));
+        std::optional<std::string> formatted =
+            interval != 0 ? formatInterval(microseconds) : formatTime(static_cast<std::int64_t>(microseconds));
         if (!formatted) {
             throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "The time is out of range.");
         }

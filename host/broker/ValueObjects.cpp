@@ -1,8 +1,8 @@
 #include "broker/Convert.h"
+#include "broker/DateTimes.h"
 #include "broker/Encapsulation.h"
 #include "broker/FunctionTables.h"
 #include "broker/NamedValues.h"
-#include "cim/DateTime.h"
 
 // The encapsulated objects that contain only values: strings, datetimes, arrays, enumerations, arguments, contexts.
 
@@ -23,7 +23,7 @@ const char* getCharPtr(const CMPIString* string, CMPIStatus* rc) {
 /** A time before 1970 is returned as the two's complement of a negative number. */
 CMPIUint64 getBinaryFormat(const CMPIDateTime* time, CMPIStatus* rc) {
     return guarded<CMPIUint64>(rc, 0, [&] {
-        const std::optional<std::int64_t> binary = cim::microsecondsOf(content(time).value);
+        const std::optional<std::int64_t> binary = microsecondsOf(content(time).value);
         if (!binary) {
             throw Failure(CMPI_RC_ERR_FAILED, "A datetime with unknown fields has no binary form.");
         }
@@ -39,8 +39,8 @@ CMPIString* getStringFormat(const CMPIDateTime* time, CMPIStatus* rc) {
 }
 
 CMPIBoolean isIntervalTime(const CMPIDateTime* time, CMPIStatus* rc) {
-    return guarded<CMPIBoolean>(
-        rc, 0, [&] { return static_cast<CMPIBoolean>(cim::isIntervalForm(content(time).value) ? 1 : 0); });
+    return guarded<CMPIBoolean>(rc, 0,
+                                [&] { return static_cast<CMPIBoolean>(isIntervalForm(content(time).value) ? 1 : 0); });
 }
 
 // CMPIArray.
