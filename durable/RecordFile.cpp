@@ -104,7 +104,7 @@ std::string RecordFile::prepare(const std::string& current) const {
 std::string RecordFile::save(const std::string& current, bool isInUse) const {
     const SavedCopies::Copy copy = savedCopy();
     const bool isNew = current.empty() && copy.content.empty();
-    const std::string records = isComplete(current) ? current : isNew ? "0\n" : copy.content;
+    std::string records = isComplete(current) ? current : isNew ? "0\n" : copy.content;
     if (isNew) {
         createFile(file, 0666);
     }

@@ -56,8 +56,8 @@ SavedCopies::Copy SavedCopies::read(const std::string& path) const {
 }
 
 std::string SavedCopies::withoutLastLine(const std::string& content) const {
-    Copy copy = parse(content);
-    return copy.content.empty() ? content : std::move(copy.content);
+    const Copy copy = parse(content);
+    return copy.content.empty() ? content : copy.content;
 }
 
 /** Both copies, the older one first. */

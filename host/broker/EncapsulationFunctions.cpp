@@ -30,7 +30,7 @@ std::vector<NamedValue> initialProperties(const ObjectPath& path, const ClassInf
     for (const PropertyInfo& property : classInfo->properties) {
         const NamedValue* key = property.isKey ? findNamed(path.keys, property.name) : nullptr;
         if (key != nullptr) {
-            properties.push_back({property.name, key->value});
+            properties.emplace_back(property.name, key->value);
         }
     }
     return properties;
