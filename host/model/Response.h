@@ -35,6 +35,9 @@ struct Response {
     static Response failed(Status status) { return {std::move(status)}; }
     static Response ofInstances(std::vector<Instance> instances) { return {{}, std::move(instances)}; }
     static Response ofPaths(std::vector<ObjectPath> paths) { return {{}, {}, std::move(paths)}; }
+    static Response ofValue(Value value, std::vector<NamedValue> output = {}) {
+        return {{}, {}, {}, std::move(value), std::move(output)};
+    }
 
     bool ok() const { return status.ok(); }
 

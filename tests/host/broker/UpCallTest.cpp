@@ -31,7 +31,7 @@ public:
             case Operation::deleteInstance:
                 return {};
             case Operation::invokeMethod:
-                return {{}, {}, {}, testsupport::text(request.member), request.input};
+                return Response::ofValue(testsupport::text(request.member), request.input);
             default:
                 return cimhost::notSupported(request.operation);
         }
