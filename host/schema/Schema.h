@@ -104,7 +104,7 @@ public:
     /** The class of this name, or null. */
     const Class* findClass(std::string_view name) const;
 
-    /** All classes in the order in which they were added. */
+    /** All classes in the order in which they were added. Adding a class ends the validity of iterators. */
     const std::vector<const Class*>& classes() const { return inOrder; }
 
     /** Whether a class is the ancestor or derived from it. An unknown class has no ancestors. */
