@@ -2,6 +2,8 @@
 
 #include <cmpidt.h>
 
+#include <atomic>
+#include <cstddef>
 #include <functional>
 #include <memory>
 #include <string>
@@ -27,6 +29,9 @@ struct ClassInfo {
     std::string name{};
     std::vector<PropertyInfo> properties{};
     std::vector<std::string> superclasses{};  ///< names, the direct superclass first
+
+    /** The number of properties of the last instance that a provider returned; others usually have as many. */
+    mutable std::atomic<std::size_t> usualCount{0};
 };
 
 /** Returns the class of a case-insensitive name; null for an unknown class. */

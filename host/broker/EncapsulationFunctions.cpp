@@ -18,12 +18,20 @@ Arena& arenaOf(const CMPIBroker* broker) {
     return Broker::of(broker).arena();
 }
 
-constexpr std::size_t usualPropertyCount = 16;
+/** The number of properties that a provider will probably set. Memory for more would make large results slower. */
+std::size_t expectedCount(const ClassInfo* classInfo) {
+    constexpr std::size_t ofUnknownClass = 16;
+    if (classInfo == nullptr) {
+        return ofUnknownClass;
+    }
+    const std::size_t usual = classInfo->usualCount;
+    return usual != 0 ? usual : classInfo->properties.size();
+}
 
 /** The keys of a path that are properties of the class. The provider sets the others next. */
 std::vector<NamedValue> initialProperties(const ObjectPath& path, const ClassInfo* classInfo) {
     std::vector<NamedValue> properties;
-    properties.reserve(classInfo == nullptr ? usualPropertyCount : classInfo->properties.size());
+    properties.reserve(expectedCount(classInfo));
     if (classInfo == nullptr) {
         return properties;
     }

@@ -46,7 +46,11 @@ CMPIStatus returnInstance(const CMPIResult* result, const CMPIInstance* instance
             throw Failure(CMPI_RC_ERR_NOT_SUPPORTED);
         }
         recordNull(target, instance);
-        target.events->emplace_back(argument(instance).value.share());
+        InstanceContent& returned = argument(instance);
+        if (returned.classInfo != nullptr) {
+            returned.classInfo->usualCount = returned.value->properties.size();
+        }
+        target.events->emplace_back(returned.value.share());
     });
 }
 

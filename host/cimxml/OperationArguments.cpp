@@ -1,7 +1,7 @@
 #include "cimxml/OperationArguments.h"
 
+#include <algorithm>
 #include <set>
-#include <sstream>
 
 #include "cim/Names.h"
 #include "cimxml/Errors.h"
@@ -14,6 +14,18 @@ namespace {
     throw CimError(CMPI_RC_ERR_INVALID_PARAMETER, "Parameter " + std::string(name) + " " + why + ".");
 }
 
+/** Whether a name is one of several with a space between them. */
+bool isOneOf(std::string_view names, std::string_view name) {
+    while (!names.empty()) {
+        const std::string_view each = names.substr(0, names.find(' '));
+        if (cim::sameName(each, name)) {
+            return true;
+        }
+        names.remove_prefix(std::min(names.size(), each.size() + 1));
+    }
+    return false;
+}
+
 const std::string& valueOf(std::string_view name, const XmlElement& element) {
     if (element.name != "VALUE" || !element.children.empty()) {
         invalid(name, "is not a single value");
@@ -24,15 +36,9 @@ const std::string& valueOf(std::string_view name, const XmlElement& element) {
 }  // namespace
 
 void OperationArguments::requireKnown(std::string_view names) const {
-    std::set<std::string, cim::NameLess> found;
+    std::set<std::string_view, cim::NameLess> found;
     for (const auto& [name, element] : message.parameters) {
-        std::istringstream known{std::string(names)};
-        std::string each;
-        bool isKnown = false;
-        while (!isKnown && known >> each) {
-            isKnown = cim::sameName(each, name);
-        }
-        if (!isKnown) {
+        if (!isOneOf(names, name)) {
             invalid(name, "is not one of " + message.method);
         }
         if (!found.insert(name).second) {

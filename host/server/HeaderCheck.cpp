@@ -67,7 +67,8 @@ bool isName(const std::string& name) {
 /** Refuses a head for which other software could see another end of the request, and so another next request. */
 std::optional<HttpResponse> checkFraming(const Headers& headers) {
     const auto isWrong = [](const auto& each) {
-        return !isName(each.first) || each.second.find_first_of("\r\n") != std::string::npos;
+        return !isName(each.first) || each.second.find('\r') != std::string::npos ||
+               each.second.find('\n') != std::string::npos;
     };
     if (headers.count("Host") > 1 || std::any_of(headers.begin(), headers.end(), isWrong)) {
         return refusal(400, "A header is malformed, or the header Host is repeated.");

@@ -1,21 +1,21 @@
 #pragma once
 
-#include <map>
+#include <iterator>
 #include <optional>
 #include <string>
-#include <string_view>
+#include <unordered_map>
 
 #include "cim/Names.h"
 
 namespace cimhost::server {
 
 /** Headers by name; the names ignore letter case. */
-using Headers = std::multimap<std::string, std::string, cim::NameLess>;
+using Headers = std::unordered_multimap<std::string, std::string, cim::NameHash, cim::NameEqual>;
 
 /** The value of a header; none if it is absent or there several times. */
-inline std::optional<std::string> headerIn(const Headers& headers, std::string_view name) {
-    const auto found = headers.equal_range(name);
-    return headers.count(name) == 1 ? std::optional(found.first->second) : std::nullopt;
+inline std::optional<std::string> headerIn(const Headers& headers, const std::string& name) {
+    const auto [first, end] = headers.equal_range(name);
+    return first != end && std::next(first) == end ? std::optional(first->second) : std::nullopt;
 }
 
 /** The head of an HTTP request. */

@@ -225,8 +225,10 @@ TEST_F(RecordingBrokerTest, EmulatingRecordsNoCalls) {
 
 TEST_F(RecordingBrokerTest, KnowsTheGivenClasses) {
     recorder.know([](const std::string& name) {
-        return std::make_shared<cimhost::ClassInfo>(
-            cimhost::ClassInfo{name, {{"Size", CMPI_uint32, false, false, {}}}, {}});
+        auto info = std::make_shared<cimhost::ClassInfo>();
+        info->name = name;
+        info->properties = {{"Size", CMPI_uint32, false, false, {}}};
+        return info;
     });
     CMPIInstance* instance = handle()->eft->newInstance(handle(), newPath(), &status);
     EXPECT_EQ(instance->ft->setProperty(instance, "Length", chars("x"), CMPI_chars).rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);

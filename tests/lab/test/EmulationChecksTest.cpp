@@ -21,14 +21,14 @@ protected:
     EmulationChecksTest() {
         add("Typed_Thing", "Echo", "EchoProvider", true, false);
         options.classInfo = [](const std::string& name) {
-            const cimhost::ClassInfo shape{"Typed_Thing",
-                                           {{"Name", CMPI_string, false, true, {}},
-                                            {"Size", CMPI_uint8, false, false, {}},
-                                            {"Depth", CMPI_sint32, false, false, {}},
-                                            {"Since", CMPI_dateTime, false, false, {}},
-                                            {"Note", CMPI_string, false, false, {}}},
-                                           {}};
-            return name == shape.name ? std::make_shared<cimhost::ClassInfo>(shape) : nullptr;
+            auto shape = std::make_shared<cimhost::ClassInfo>();
+            shape->name = "Typed_Thing";
+            shape->properties = {{"Name", CMPI_string, false, true, {}},
+                                 {"Size", CMPI_uint8, false, false, {}},
+                                 {"Depth", CMPI_sint32, false, false, {}},
+                                 {"Since", CMPI_dateTime, false, false, {}},
+                                 {"Note", CMPI_string, false, false, {}}};
+            return name == shape->name ? shape : nullptr;
         };
     }
 

@@ -45,16 +45,18 @@ protected:
     }
 
     static std::shared_ptr<const cimhost::ClassInfo> infoOf(const std::string& name) {
+        auto info = std::make_shared<cimhost::ClassInfo>();
         if (cim::foldedName(name) == "echo_thing") {
-            return std::make_shared<cimhost::ClassInfo>(cimhost::ClassInfo{"Echo_Thing",
-                                                                           {{"Name", CMPI_string, false, true, {}},
-                                                                            {"Text", CMPI_string, false, false, {}},
-                                                                            {"Size", CMPI_uint32, false, false, {}}},
-                                                                           {}});
+            info->name = "Echo_Thing";
+            info->properties = {{"Name", CMPI_string, false, true, {}},
+                                {"Text", CMPI_string, false, false, {}},
+                                {"Size", CMPI_uint32, false, false, {}}};
+            return info;
         }
         if (name == "Echo_Link") {
-            return std::make_shared<cimhost::ClassInfo>(
-                cimhost::ClassInfo{"Echo_Link", {{"End", CMPI_ref, false, true, "Echo_Thing"}}, {}});
+            info->name = name;
+            info->properties = {{"End", CMPI_ref, false, true, "Echo_Thing"}};
+            return info;
         }
         return nullptr;
     }
