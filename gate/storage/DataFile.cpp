@@ -5,11 +5,8 @@
 #include <unistd.h>
 
 #include <algorithm>
-#include <cctype>
 #include <cerrno>
 #include <filesystem>
-#include <sstream>
-#include <string_view>
 #include <system_error>
 
 #include "KO/PlatformUtilities.h"
@@ -60,16 +57,11 @@ bool hasRoom(const std::string& directory, std::size_t growth) {
     return growth == 0 || !isKnown || room > growth + block;
 }
 
-/** Whether the provider splits a record file at a character. */
-bool isSpace(char each) {
-    return std::string_view(" \t\n\v\f\r").find(each) != std::string_view::npos;
-}
-
-/** Whether a line of a record file is the identifier, and the provider reads it as one. */
+/** Whether a line of a record file is the identifier, and the provider does not split it. */
 bool hasRecord(const std::string& content, std::string identifier) {
     std::replace(identifier.begin(), identifier.end(), ' ', '_');
-    return std::none_of(identifier.begin(), identifier.end(), isSpace) &&
-           ('\n' + content).find('\n' + identifier + '\n') != std::string::npos;
+    return identifier.find_first_of("\t\n\v\f\r") == std::string::npos &&
+           content.find('\n' + identifier + '\n') != std::string::npos;
 }
 
 }  // namespace
@@ -103,26 +95,7 @@ FileState DataFile::state() const {
 
 bool DataFile::mayHave(const std::string& content, std::string identifier) const {
     std::replace(identifier.begin(), identifier.end(), ' ', '_');
-    const auto isWord = [&](std::size_t start) {
-        const std::size_t end = start + identifier.size();
-        const bool isEnded = end == content.size() || isSpace(content[end]);
-        // A word also begins after a number that is followed by other characters.
-        return isEnded && (start == 0 || isSpace(content[start - 1]) ||
-                           std::isdigit(static_cast<unsigned char>(content[start - 1])) != 0);
-    };
-    std::size_t found = content.find(identifier);
-    while (found != std::string::npos && !isWord(found)) {
-        found = content.find(identifier, found + 1);
-    }
-    return found != std::string::npos || !records().isComplete(content);
-}
-
-std::string DataFile::firstIdentifier(const std::string& content) {
-    std::istringstream words(content);
-    std::string identifier;
-    words >> identifier >> identifier;
-    std::replace(identifier.begin(), identifier.end(), '_', ' ');
-    return words ? identifier : std::string();
+    return content.find(identifier) != std::string::npos || !records().isComplete(content);
 }
 
 void DataFile::begin(FileState& before) const {

@@ -40,11 +40,8 @@ struct DataFile {
 
     durable::RecordFile records() const;
 
-    /** Whether a record may have the identifier: the record file is incomplete, or a word of it is the identifier. */
+    /** Whether a record may have the identifier: the record file is incomplete or contains the identifier. */
     bool mayHave(const std::string& content, std::string identifier) const;
-
-    /** The identifier of the first record; empty if there is none. */
-    static std::string firstIdentifier(const std::string& content);
 
     /** @name Storing a change: begin(), the provider's writing, then commit() or rollBack() */
     ///@{

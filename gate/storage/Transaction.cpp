@@ -9,8 +9,6 @@ namespace gate {
 
 namespace {
 
-constexpr const char* identifierKey = "InstanceID";
-
 /** The most bytes that values take in a file. */
 std::size_t sizeOf(const Values& values) {
     std::size_t size = 0;
@@ -81,12 +79,12 @@ std::string Transaction::rollBack(const FileState& before) const {
 }
 
 void Transaction::create(const std::string& identifier, const Values& given, const std::function<void()>& returnPath) {
-    requireRoundTrip(file, {{cim::findNamed(owner, identifierKey), identifier}});
+    requireRoundTrip(file, {{cim::findNamed(owner, "InstanceID"), identifier}});
     requireRoundTrip(file, given);
     const FileState start = open(identifier.size() + 1 + sizeOf(given));
     const bool exists = file.mayHave(start.content, identifier) && session.find(path, owner) != nullptr;
     failIf(exists, CMPI_RC_ERR_ALREADY_EXISTS, owner.name, " ", identifier, " already exists.");
-    requireReadOnlyValues(given, start.content);
+    requireReadOnlyValues(given);
     run(start, [&](const FileState& before) {
         const CMPIInstance* current = session.create(path);
         const Values changes = diff(current, given, false);
@@ -153,26 +151,14 @@ void Transaction::storeTable(const CMPIObjectPath* record) const {
     file.commit({}, true);
 }
 
-/** A record of the file; null if it has none. Lists the names only if it has lost the first record's identifier. */
-const CMPIInstance* Transaction::anyRecord(const std::string& content) const {
-    const std::string identifier = DataFile::firstIdentifier(content);
-    if (identifier.empty()) {
-        return nullptr;
-    }
-    const LocalObject first(nameSpaceOf(path.path()), owner, {{cim::findNamed(owner, identifierKey), identifier}});
-    const CMPIInstance* record = session.find(first, owner);
-    const Paths others = record == nullptr ? session.names(owner) : Paths();
-    return others.empty() ? record : session.get(localPath(others.front(), owner), owner);
-}
-
 /** Refuses other read-only values than an existing record has, since all records have the same. */
-void Transaction::requireReadOnlyValues(const Values& given, const std::string& content) const {
+void Transaction::requireReadOnlyValues(const Values& given) const {
     Values readOnly;
     std::copy_if(given.begin(), given.end(), std::back_inserter(readOnly),
                  [](const auto& value) { return !value.first->isWritable; });
-    const CMPIInstance* record = readOnly.empty() ? nullptr : anyRecord(content);
-    if (record != nullptr) {
-        diff(record, readOnly, false);
+    const Paths records = readOnly.empty() ? Paths() : session.names(owner);
+    if (!records.empty()) {
+        diff(session.get(localPath(records.front(), owner), owner), readOnly, false);
     }
 }
 

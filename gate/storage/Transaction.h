@@ -44,8 +44,7 @@ private:
     void apply(const CMPIInstance* current, const Values& changes) const;
     void requireTable() const;
     void storeTable(const CMPIObjectPath* record) const;
-    const CMPIInstance* anyRecord(const std::string& content) const;
-    void requireReadOnlyValues(const Values& given, const std::string& content) const;
+    void requireReadOnlyValues(const Values& given) const;
 
     ProviderSession& session;
     const Class& owner;
