@@ -73,12 +73,11 @@ durable::RecordFile DataFile::records() const {
 void DataFile::requireWritable(std::size_t growth) const {
     const std::string path = pathOf(*this);
     const std::string directory = KO::PlatformUtilities::getKelsaDataDir();
+    const std::string subject = path + ": the data directory " + directory;
     requireWritableFile(path);
     // A rollback and the change of a property file replace the file.
     if (access(directory.c_str(), W_OK | X_OK) != 0) {
-        const int error = errno;
-        const std::string subject = "the data directory " + directory;
-        throw std::system_error(error, std::generic_category(), path + ": " + subject);
+        throw std::system_error(errno, std::generic_category(), subject);
     }
     if (!hasRoom(directory, growth)) {
         throw std::system_error(ENOSPC, std::generic_category(), path);
