@@ -47,8 +47,9 @@ class ProviderConnection {
 public:
     /** The provider's table of a record file. */
     struct Table {
-        const char* name;         ///< of the class
-        bool isRead = false;      ///< whether it is known that the provider has read the file
+        const char* name;                    ///< of the class
+        std::optional<std::size_t> count{};  ///< of the file's records when the provider was loaded
+        bool isRead = false;                 ///< whether it is known that the provider has read the file
         bool isVerified = false;  ///< whether it has been compared with the file since the provider was loaded
     };
 
@@ -113,7 +114,6 @@ private:
     ProviderLibrary library{};
     bool isOutdated = false;
     std::array<Table, durable::recordFileCount> tables{Table{"VELKO_Lease"}, Table{"VELKO_Warranty"}};  ///< by file
-    std::array<std::optional<std::size_t>, durable::recordFileCount> counts{};  ///< when the provider was loaded
     std::size_t upCalls = 0;  ///< requests in the provider that have released the lock
     std::optional<WrappedBroker> wrapped{};
     ProviderInterfaces providers{};

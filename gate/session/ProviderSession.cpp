@@ -1,7 +1,5 @@
 #include "ProviderSession.h"
 
-#include <algorithm>
-
 namespace gate {
 
 namespace {
@@ -27,13 +25,6 @@ void giveAll(const ClientRequest& request, const std::vector<Answer>& answers) {
 
 const CMPIInstance* firstOf(const Instances& instances) {
     return instances.empty() ? nullptr : instances.front();
-}
-
-/** Whether an instance has the keys of a path. */
-bool hasKeys(const CMPIInstance* instance, const CMPIObjectPath* path, const Class& owner) {
-    return std::all_of(owner.begin(), owner.end(), [&](const Property& property) {
-        return !property.isKey || propertyOf(instance, property) == keyOf(path, property);
-    });
 }
 
 constexpr CMPIStatus done{CMPI_RC_OK, nullptr};
@@ -187,7 +178,7 @@ const CMPIInstance* ProviderSession::find(const LocalObject& keys, const Class& 
     if (sameName(owner.name, agentClass)) {
         // A get does not end its answer for other keys than the only instance's, as after an error.
         const CMPIInstance* agent = firstOf(instances(owner));
-        return agent != nullptr && hasKeys(agent, keys.path(), owner) ? agent : nullptr;
+        return agent != nullptr && samePath(pathOf(agent), keys.path()) ? agent : nullptr;
     }
     requireRead(owner);
     return firstOf(read<&CMPIInstanceMIFT::getInstance>(request, keys, allProperties).instances);

@@ -148,11 +148,9 @@ bool RequestLock::close(std::chrono::milliseconds drainTimeout, Closing closing,
         return false;
     }
     const bool wasHeld = std::exchange(isHeld, true);  // no other closer and no returning request acquires it
-    if (atEnd) {
-        lock.unlock();
-        atEnd();
-        lock.lock();
-    }
+    lock.unlock();
+    atEnd();
+    lock.lock();
     isHeld = wasHeld;
     state = State::closed;
     ++timesClosed;
