@@ -173,10 +173,11 @@ bool samePath(const CMPIObjectPath* left, const CMPIObjectPath* right) {
     return true;
 }
 
-LocalObject::LocalObject(std::string itsNameSpace, const Class& itsClass, const Values& values)
-    : nameSpaceCharacters(std::move(itsNameSpace)), className(itsClass.name) {
+LocalObject::LocalObject(std::string itsNameSpace, const Class& itsClass, Values itsValues)
+    : nameSpaceCharacters(std::move(itsNameSpace)), className(itsClass.name), values(std::move(itsValues)) {
     for (const auto& [property, value] : values) {
-        members.emplace_back(*property, value);
+        const CMPIType type = property->type == CMPI_dateTime ? CMPIType{CMPI_string} : property->type;
+        members.push_back({property->name, type, value});
     }
 }
 

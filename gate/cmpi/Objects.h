@@ -2,7 +2,6 @@
 
 #include <cmpift.h>
 
-#include <deque>
 #include <optional>
 #include <string>
 #include <utility>
@@ -120,7 +119,7 @@ bool samePath(const CMPIObjectPath* left, const CMPIObjectPath* right);
 class LocalObject {
 public:
     /** @param values the keys of a path or the properties of an instance */
-    LocalObject(std::string itsNameSpace, const Class& itsClass, const Values& values = {});
+    LocalObject(std::string itsNameSpace, const Class& itsClass, Values itsValues = {});
     LocalObject(const LocalObject&) = delete;
     LocalObject& operator=(const LocalObject&) = delete;
 
@@ -131,14 +130,9 @@ public:
 
 private:
     struct Member {
-        Member(const Property& property, std::string itsValue)
-            : name(property.name),
-              type(property.type == CMPI_dateTime ? CMPIType{CMPI_string} : property.type),
-              characters(std::move(itsValue)) {}
-
         const char* name;
         CMPIType type;
-        std::string characters;
+        const std::string& characters;
         StaticString nameString{name};
         StaticString valueString{characters.c_str()};
     };
@@ -155,7 +149,8 @@ private:
     std::string nameSpaceCharacters;
     StaticString nameSpace{nameSpaceCharacters.c_str()};
     StaticString className;
-    std::deque<Member> members{};  ///< whose elements stay where they are
+    const Values values;
+    std::vector<Member> members{};  ///< one per value
     CMPIObjectPath pathHandle{this, &pathFunctions};
     CMPIInstance instanceHandle{this, &instanceFunctions};
 };

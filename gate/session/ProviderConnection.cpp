@@ -103,7 +103,7 @@ void ProviderConnection::connect(const CMPIBroker* manager) {
     wrapped.emplace(manager, WrappedBroker::Lock{beginUpCall, endUpCall});
     try {
         if (library.isLoaded()) {
-            createInterfaces();
+            library.createInterfaces(wrapped->handle());
         } else {
             load();  // if the files are being written, again at the first request
         }
@@ -147,12 +147,12 @@ bool ProviderConnection::load() {
         return false;  // a request may read the older tables
     }
     isOutdated = true;
-    unload();
+    library.unload();
     const auto counts = theDirectory.recordCounts();
     library.load();
     shutdownAtExit.registerAgain();
     if (!theDirectory.hasChanged()) {
-        createInterfaces();
+        library.createInterfaces(wrapped->handle());
         isOutdated = false;
         for (std::size_t index = 0; index < tables.size(); ++index) {
             tables[index] = {tables[index].name, counts[index]};
@@ -177,17 +177,6 @@ void ProviderConnection::requireRead(const Class& owner, std::size_t count) {
     table->isRead = true;
 }
 
-void ProviderConnection::unload() {
-    providers = {};
-    library.unload();
-}
-
-void ProviderConnection::createInterfaces() {
-    providers = library.createInterfaces(wrapped->handle());
-    failIf(providers.instances == nullptr || providers.associations == nullptr, CMPI_RC_ERR_FAILED,
-           "The provider did not return its interfaces.");
-}
-
 const CMPIBroker* ProviderConnection::broker() const {
     const std::lock_guard<std::mutex> lock(mutex);
     return managersOwn;
@@ -196,7 +185,8 @@ const CMPIBroker* ProviderConnection::broker() const {
 void ProviderConnection::shutdown(const CMPIContext* context) {
     std::exception_ptr failure;
     theRequestLock.close(drainTimeout, RequestLock::Closing::temporary, [&] {
-        const auto [instances, associations] = providers;
+        auto* const instances = library.interface<CMPIInstanceMI>();
+        auto* const associations = library.interface<CMPIAssociationMI>();
         try {
             if (broker() != nullptr && instances != nullptr && associations != nullptr) {
                 instances->ft->cleanup(instances, context, 1);
@@ -230,7 +220,7 @@ void ProviderConnection::set(const CMPIBroker* manager) {
 
 void ProviderConnection::endProcess() {
     if (upCalls == 0) {
-        unload();
+        library.unload();
         theDirectory.close();
     }
 }

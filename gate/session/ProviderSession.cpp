@@ -61,14 +61,10 @@ CMPIResultFT collectorFunctions{
     nullptr,
 };
 
-template <class Function>
-CMPIInstanceMI* interfaceOf(Function CMPIInstanceMIFT::*) {
-    return theConnection.interfaces().instances;
-}
-
-template <class Function>
-CMPIAssociationMI* interfaceOf(Function CMPIAssociationMIFT::*) {
-    return theConnection.interfaces().associations;
+/** The provider's interface that has a function of this type. */
+template <class Table, class Interface, class... Arguments>
+Interface* interfaceOf(CMPIStatus (*Table::*)(Interface*, Arguments...)) {
+    return theConnection.provider().interface<Interface>();
 }
 
 /** Calls a function of one of the provider's interfaces. */
