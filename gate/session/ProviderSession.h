@@ -16,7 +16,7 @@ struct ClientRequest {
     const CMPIContext* context;
     const CMPIResult* result;
     const CMPIObjectPath* path;
-    std::size_t generation;  ///< of the request lock when the request began
+    std::size_t generation = theRequestLock.generation();  ///< when the request began
 
     bool hasManager() const { return theRequestLock.generation() == generation; }
 

@@ -109,7 +109,6 @@ public:
     ActiveRequest& operator=(const ActiveRequest&) = delete;
 
     const bool isAdmitted;
-    const std::size_t generation = theRequestLock.generation();
 };
 
 /** Disables the cancellation of the calling thread, which would end the process or leave a file incomplete. */
