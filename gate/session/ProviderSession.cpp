@@ -137,10 +137,7 @@ Paths ProviderSession::names(const Class& owner) const {
     return paths;
 }
 
-/**
- * Fails unless the provider has read the records of a class, or of both classes that an association connects. Lists
- * them once after the provider was loaded.
- */
+/** Fails unless the provider has read the records of a class, or of both classes that an association connects. */
 void ProviderSession::requireRead(const Class& owner) const {
     for (const Property& property : owner) {
         if (property.referenceClass != nullptr) {

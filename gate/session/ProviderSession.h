@@ -37,14 +37,11 @@ struct ClientRequest {
     const Class& requestedClass() const;
 
     /**
-     * @name Returns the answers to the client and ends
-     * Called when all answers exist, so that a request that fails returns none. Fails if the object manager does not
-     * accept one.
+     * Returns the answers to the client and ends. Called when all answers exist, so that a request that fails returns
+     * none. Fails if the object manager does not accept one.
      */
-    ///@{
     void give(const Instances& instances) const;
     void give(const Paths& paths) const;
-    ///@}
 };
 
 /**
@@ -65,17 +62,13 @@ public:
     /** Begins the session. For a change, this process must own the data directory. */
     explicit ProviderSession(const ClientRequest& itsRequest, Access access = Access::read);
 
-    /** @name All instances of a class, in the request's namespace */
-    ///@{
+    /** All instances of a class, in the request's namespace. */
     Paths names(const Class& owner) const;
     Instances instances(const Class& owner) const;
-    ///@}
 
-    /** @name The leases or warranties of a computer, whose path has its keys */
-    ///@{
+    /** The leases or warranties of a computer, whose path has its keys. */
     Paths associatorNames(const LocalObject& computer, const Class& association) const;
     Instances associators(const LocalObject& computer, const Class& association) const;
-    ///@}
 
     /** The instance with the keys; null if there is none. */
     const CMPIInstance* find(const LocalObject& keys, const Class& owner) const;

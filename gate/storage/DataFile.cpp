@@ -97,8 +97,8 @@ bool DataFile::mayHave(const std::string& content, std::string identifier) const
     return content.find(identifier) != std::string::npos || !records().isComplete(content);
 }
 
-void DataFile::begin(FileState& before) const {
-    before.restorable = hasRecords ? records().prepare(before.content) : before.content;
+std::string DataFile::begin(const std::string& content) const {
+    return hasRecords ? records().prepare(content) : content;
 }
 
 void DataFile::commit(const FileState& before, bool mustDiffer, const std::string* identifier) const {
@@ -106,7 +106,8 @@ void DataFile::commit(const FileState& before, bool mustDiffer, const std::strin
         return;
     }
     const FileState now = state();
-    failIf(mustDiffer && now == before, CMPI_RC_ERR_FAILED, fileName, " was not written.");
+    const bool isSame = now.modified == before.modified && now.content == before.content;
+    failIf(mustDiffer && isSame, CMPI_RC_ERR_FAILED, fileName, " was not written.");
     const durable::RecordFile file = records();
     if (!file.isComplete(now.content)) {
         failToStore(file.path(), "it does not hold all records; the disk may be full");
@@ -117,15 +118,15 @@ void DataFile::commit(const FileState& before, bool mustDiffer, const std::strin
     file.commit(now.content);
 }
 
-void DataFile::rollBack(const FileState& before) const {
-    if (hasRecords && before.restorable.empty()) {
+void DataFile::rollBack(const std::string& before) const {
+    if (hasRecords && before.empty()) {
         failToStore(pathOf(*this), "it was damaged before, and there is no saved copy");
     }
     if (hasRecords) {
-        records().restore(before.restorable);
-    } else if (!(state() == before)) {
+        records().restore(before);
+    } else if (state().content != before) {
         const std::string path = std::filesystem::canonical(pathOf(*this));  // replaces the target of a link
-        durable::replaceFile(path, before.content, path);
+        durable::replaceFile(path, before, path);
         durable::syncDirectoryOf(path);
     }
 }

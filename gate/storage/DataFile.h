@@ -13,9 +13,6 @@ namespace gate {
 struct FileState {
     std::string content;  ///< empty if the file does not exist
     std::filesystem::file_time_type modified{};
-    std::string restorable{};  ///< content for rollBack(); empty if it is unknown
-
-    bool operator==(const FileState& other) const { return modified == other.modified && content == other.content; }
 };
 
 /**
@@ -45,8 +42,8 @@ struct DataFile {
 
     /** @name Storing a change: begin(), the provider's writing, then commit() or rollBack() */
     ///@{
-    /** Makes the current state restorable. */
-    void begin(FileState& before) const;
+    /** Makes the current content restorable. Returns what rollBack() needs; empty if the content is damaged. */
+    std::string begin(const std::string& content) const;
 
     /**
      * Syncs the file and the saved copy. Fails if the file is incomplete, or must differ from a state but does not.
@@ -54,8 +51,8 @@ struct DataFile {
      */
     void commit(const FileState& before, bool mustDiffer, const std::string* identifier = nullptr) const;
 
-    /** Restores the file to the state that was passed to begin(). */
-    void rollBack(const FileState& before) const;
+    /** Restores the content. @param before the result of begin() */
+    void rollBack(const std::string& before) const;
     ///@}
 };
 

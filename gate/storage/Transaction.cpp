@@ -40,36 +40,36 @@ FileState Transaction::open(std::size_t growth) const {
 }
 
 /**
- * Calls `change(before)`, which makes a change, checks it and commits it. If it fails, rolls the change back and passes
+ * Calls `change()`, which makes a change, checks it and commits it. If it fails, rolls the change back and passes
  * the failure on, with a note if the file could not be restored.
  */
 template <class Change>
-void Transaction::run(FileState before, Change change) const {
-    onFiles([&] { file.begin(before); });
+void Transaction::run(const FileState& before, Change change) const {
+    const std::string restorable = onFiles([&] { return file.begin(before.content); });
     try {
-        onFiles([&] { change(before); });
+        onFiles(change);
     } catch (Failure& failure) {
-        failure.message += rollBack(before);
+        failure.message += rollBack(restorable);
         throw;
     } catch (const std::exception& exception) {
-        const std::string note = rollBack(before);
+        const std::string note = rollBack(restorable);
         if (note.empty()) {
             throw;
         }
         fail(CMPI_RC_ERR_FAILED, "The request failed: ", exception.what(), ".", note);
     } catch (...) {
-        rollBack(before);
+        rollBack(restorable);
         throw;
     }
 }
 
 /** Restores the file and lets the provider read it again. Returns a note for the client if the file is not restored. */
-std::string Transaction::rollBack(const FileState& before) const {
+std::string Transaction::rollBack(const std::string& restorable) const {
     try {
-        if (file.hasRecords && !before.restorable.empty()) {
+        if (file.hasRecords && !restorable.empty()) {
             theConnection.setOutdated();
         }
-        onFiles([&] { file.rollBack(before); });
+        onFiles([&] { file.rollBack(restorable); });
         return {};
     } catch (const Failure& failure) {
         return " The change could not be rolled back. " + failure.message;
@@ -81,11 +81,11 @@ std::string Transaction::rollBack(const FileState& before) const {
 void Transaction::create(const std::string& identifier, const Values& given, const std::function<void()>& returnPath) {
     requireRoundTrip(file, {{cim::findNamed(owner, "InstanceID"), identifier}});
     requireRoundTrip(file, given);
-    const FileState start = open(identifier.size() + 1 + sizeOf(given));
-    const bool exists = file.mayHave(start.content, identifier) && session.find(path, owner) != nullptr;
+    const FileState before = open(identifier.size() + 1 + sizeOf(given));
+    const bool exists = file.mayHave(before.content, identifier) && session.find(path, owner) != nullptr;
     failIf(exists, CMPI_RC_ERR_ALREADY_EXISTS, owner.name, " ", identifier, " already exists.");
     requireReadOnlyValues(given);
-    run(start, [&](const FileState& before) {
+    run(before, [&] {
         const CMPIInstance* current = session.create(path);
         const Values changes = diff(current, given, false);
         const FileState created = altersFile(file, current, changes) ? file.state() : before;
@@ -99,14 +99,16 @@ void Transaction::create(const std::string& identifier, const Values& given, con
 
 void Transaction::modify(const CMPIInstance* current, const Values& changes) {
     requireRoundTrip(file, changes);
-    run(open(sizeOf(changes)), [&](const FileState& before) {
+    const FileState before = open(sizeOf(changes));
+    run(before, [&] {
         apply(current, changes);
         file.commit(before, altersFile(file, current, changes));
     });
 }
 
 void Transaction::remove() {
-    run(open(0), [&](const FileState& before) {
+    const FileState before = open(0);
+    run(before, [&] {
         session.remove(path);
         file.commit(before, true);
     });
@@ -118,10 +120,7 @@ void Transaction::apply(const CMPIInstance* current, const Values& changes) cons
     requireChanged(owner, file, current, session.get(path, owner), changes);
 }
 
-/**
- * Fails if the provider does not have as many records as its file, so that its next write would lose some: it does not
- * report that it could not read the file.
- */
+/** Fails if the provider has not as many records as its file, so that its next write would lose some. */
 void Transaction::requireTable() const {
     if (!file.hasRecords || (theConnection.tableOf(owner)->isVerified && file.records().isStored())) {
         return;

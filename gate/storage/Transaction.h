@@ -38,8 +38,8 @@ public:
 private:
     FileState open(std::size_t growth) const;
     template <class Change>
-    void run(FileState before, Change change) const;
-    std::string rollBack(const FileState& before) const;
+    void run(const FileState& before, Change change) const;
+    std::string rollBack(const std::string& restorable) const;
 
     void apply(const CMPIInstance* current, const Values& changes) const;
     void requireTable() const;
