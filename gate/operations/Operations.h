@@ -28,7 +28,6 @@ public:
 
 private:
     const Class& owner;
-    bool hasList;
     std::vector<const char*> names{};
     bool isComplete;  ///< whether it has all properties of the class
 };

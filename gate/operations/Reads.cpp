@@ -5,15 +5,15 @@
 namespace gate {
 
 PropertySelection::PropertySelection(const char** list, const Class& itsClass)
-    : owner(itsClass), hasList(list != nullptr) {
-    for (const char** name = list; hasList && *name != nullptr; ++name) {
+    : owner(itsClass), isComplete(list == nullptr) {
+    for (const char** name = list; list != nullptr && *name != nullptr; ++name) {
         names.push_back(*name);
     }
     isComplete = std::all_of(owner.begin(), owner.end(), [&](const Property& property) { return has(property); });
 }
 
 bool PropertySelection::has(const Property& property) const {
-    return !hasList ||
+    return isComplete ||
            std::any_of(names.begin(), names.end(), [&](const char* name) { return sameName(name, property.name); });
 }
 

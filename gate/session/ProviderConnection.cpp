@@ -85,9 +85,7 @@ static ShutdownAtExit shutdownAtExit;  // destroyed before the objects above
 void ProviderConnection::connect(const CMPIBroker* manager) {
     theRequestLock.open();
     const ActiveRequest active;
-    if (!active.isAdmitted) {
-        throw ManagerGone{};
-    }
+    ManagerGone::throwUnless(active.isAdmitted);
     if (isConnectedTo(manager)) {
         return;
     }

@@ -19,8 +19,9 @@ void giveAll(const ClientRequest& request, const std::vector<Answer>& answers) {
     requireOk(task, tell<&CMPIResultFT::returnDone>(request.result));
 }
 
-[[noreturn]] void failUnfinished() {
-    fail(CMPI_RC_ERR_FAILED, "The provider did not finish its answer; see the agent's log at level 3000.");
+void requireFinished(bool isFinished) {
+    failIf(!isFinished, CMPI_RC_ERR_FAILED,
+           "The provider did not finish its answer; see the agent's log at level 3000.");
 }
 
 const CMPIInstance* firstOf(const Instances& instances) {
@@ -89,9 +90,7 @@ template <auto function, class... Arguments>
 ProviderAnswer read(const ClientRequest& request, const LocalObject& path, Arguments... arguments) {
     ProviderAnswer answer = call<function>(request, path, arguments...);
     require(!theConnection.wrappedBroker().hasFailed, "create the paths and instances of the answer");
-    if (!answer.isDone) {
-        failUnfinished();
-    }
+    requireFinished(answer.isDone);
     return answer;
 }
 
@@ -99,9 +98,7 @@ ProviderAnswer read(const ClientRequest& request, const LocalObject& path, Argum
 
 const CMPIBroker* ClientRequest::broker() const {
     const CMPIBroker* found = brokerOrNull();
-    if (found == nullptr) {
-        throw ManagerGone{};
-    }
+    ManagerGone::throwUnless(found != nullptr);
     return found;
 }
 
@@ -187,9 +184,7 @@ const CMPIInstance* ProviderSession::create(const LocalObject& keys) {
     // The provider ignores the instance.
     const CMPIInstance* created =
         firstOf(read<&CMPIInstanceMIFT::createInstance>(request, keys, keys.instance()).instances);
-    if (created == nullptr) {
-        failUnfinished();
-    }
+    requireFinished(created != nullptr);
     return created;
 }
 

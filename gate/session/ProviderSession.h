@@ -21,11 +21,7 @@ struct ClientRequest {
     bool hasManager() const { return theRequestLock.generation() == generation; }
 
     /** Throws ManagerGone if the object manager has ended. Called before each of its functions. */
-    void requireManager() const {
-        if (!hasManager()) {
-            throw ManagerGone{};
-        }
-    }
+    void requireManager() const { ManagerGone::throwUnless(hasManager()); }
 
     /** The broker that the latest factory call received. Throws ManagerGone if there is none. */
     const CMPIBroker* broker() const;

@@ -126,7 +126,7 @@ private:
 /** Holds the lock. The constructor throws ManagerGone if the lock is closing. */
 class LockGuard {
 public:
-    LockGuard() : isHeld(theRequestLock.acquire()) { requireHeld(); }
+    LockGuard() : isHeld(theRequestLock.acquire()) { ManagerGone::throwUnless(isHeld); }
     ~LockGuard() {
         if (isHeld) {
             theRequestLock.release();
@@ -143,16 +143,10 @@ public:
         isHeld = false;
         work();
         isHeld = theRequestLock.reacquire(generation);
-        requireHeld();
+        ManagerGone::throwUnless(isHeld);
     }
 
 private:
-    void requireHeld() const {
-        if (!isHeld) {
-            throw ManagerGone{};
-        }
-    }
-
     CancellationDisabled cancellationDisabled;
     bool isHeld;
     const std::size_t generation = theRequestLock.generation();  ///< cannot change while the lock is held

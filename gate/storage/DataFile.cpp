@@ -26,8 +26,8 @@ std::string pathOf(const DataFile& file) {
     return std::string(KO::PlatformUtilities::getKelsaDataDir()) + file.fileName;
 }
 
-[[noreturn]] void failToStore(const std::string& path, const std::string& reason) {
-    fail(CMPI_RC_ERR_FAILED, "The change cannot be stored in ", path, ": ", reason, ".");
+void failToStoreIf(bool isFailure, const std::string& path, const char* reason) {
+    failIf(isFailure, CMPI_RC_ERR_FAILED, "The change cannot be stored in ", path, ": ", reason, ".");
 }
 
 /** Fails if the file exists and cannot be written or is not a regular file. */
@@ -42,9 +42,7 @@ void requireWritableFile(const std::string& path) {
     struct stat status {};
     const bool isRegular = fstat(descriptor, &status) == 0 && S_ISREG(status.st_mode);
     close(descriptor);
-    if (!isRegular) {
-        failToStore(path, "it is not a regular file");
-    }
+    failToStoreIf(!isRegular, path, "it is not a regular file");
 }
 
 /** Whether the file system has room for the file's growth and for a block that is partly used. */
@@ -109,9 +107,7 @@ void DataFile::commit(const FileState& before, bool mustDiffer, const std::strin
     const bool isSame = now.modified == before.modified && now.content == before.content;
     failIf(mustDiffer && isSame, CMPI_RC_ERR_FAILED, fileName, " was not written.");
     const durable::RecordFile file = records();
-    if (!file.isComplete(now.content)) {
-        failToStore(file.path(), "it does not hold all records; the disk may be full");
-    }
+    failToStoreIf(!file.isComplete(now.content), file.path(), "it does not hold all records; the disk may be full");
     if (identifier != nullptr && !hasRecord(now.content, *identifier)) {
         fail(CMPI_RC_ERR_FAILED, fileName, " does not hold ", *identifier, ".");
     }
@@ -119,9 +115,7 @@ void DataFile::commit(const FileState& before, bool mustDiffer, const std::strin
 }
 
 void DataFile::rollBack(const std::string& before) const {
-    if (hasRecords && before.empty()) {
-        failToStore(pathOf(*this), "it was damaged before, and there is no saved copy");
-    }
+    failToStoreIf(hasRecords && before.empty(), pathOf(*this), "it was damaged before, and there is no saved copy");
     if (hasRecords) {
         records().restore(before);
     } else if (state().content != before) {

@@ -2,7 +2,6 @@
 
 #include <algorithm>
 #include <exception>
-#include <iterator>
 #include <system_error>
 
 namespace gate {
@@ -53,10 +52,7 @@ void Transaction::run(const FileState& before, Change change) const {
         throw;
     } catch (const std::exception& exception) {
         const std::string note = rollBack(restorable);
-        if (note.empty()) {
-            throw;
-        }
-        fail(CMPI_RC_ERR_FAILED, "The request failed: ", exception.what(), ".", note);
+        fail(CMPI_RC_ERR_FAILED, "The request failed: ", exception.what(), note.empty() ? "" : ".", note);
     } catch (...) {
         rollBack(restorable);
         throw;
@@ -152,12 +148,11 @@ void Transaction::storeTable(const CMPIObjectPath* record) const {
 
 /** Refuses other read-only values than an existing record has, since all records have the same. */
 void Transaction::requireReadOnlyValues(const Values& given) const {
-    Values readOnly;
-    std::copy_if(given.begin(), given.end(), std::back_inserter(readOnly),
-                 [](const auto& value) { return !value.first->isWritable; });
-    const Paths records = readOnly.empty() ? Paths() : session.names(owner);
+    const bool haveReadOnly =
+        std::any_of(given.begin(), given.end(), [](const auto& value) { return !value.first->isWritable; });
+    const Paths records = haveReadOnly ? session.names(owner) : Paths();
     if (!records.empty()) {
-        diff(session.get(localPath(records.front(), owner), owner), readOnly, false);
+        diff(session.get(localPath(records.front(), owner), owner), given, false);  // fails if one differs
     }
 }
 
