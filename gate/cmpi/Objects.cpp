@@ -87,6 +87,20 @@ std::optional<CMPIUint32> numberIn(const std::string& digits, CMPIType type) {
     return error == std::errc() && number <= limit ? std::optional<CMPIUint32>(number) : std::nullopt;
 }
 
+/** An integer or boolean as a CMPI value. */
+CMPIValue scalarFrom(const std::string& characters, CMPIType type) {
+    CMPIValue value{};
+    const CMPIUint32 number = numberIn(characters, type).value_or(0);
+    if (type == CMPI_boolean) {
+        value.boolean = characters == "true" ? 1 : 0;
+    } else if (type == CMPI_uint16) {
+        value.uint16 = static_cast<CMPIUint16>(number);
+    } else {
+        value.uint32 = number;
+    }
+    return value;
+}
+
 /** Whether the second path has that key of the first one. */
 bool sameKey(const CMPIData& key, const char* name, const CMPIObjectPath* other) {
     const auto found = ask<&CMPIObjectPathFT::getKey>(other, name);
@@ -132,25 +146,6 @@ CMPIObjectPath* referenceOf(const CMPIObjectPath* path, const char* key) {
     const auto answer = ask<&CMPIObjectPathFT::getKey>(path, key);
     const bool isUsable = answer.isOk() && cim::hasValue(answer.value) && answer.value.type == CMPI_ref;
     return isUsable ? answer.value.value.ref : nullptr;
-}
-
-CMPIValue scalarFrom(const std::string& characters, CMPIType type) {
-    CMPIValue value{};
-    const CMPIUint32 number = numberIn(characters, type).value_or(0);
-    if (type == CMPI_boolean) {
-        value.boolean = characters == "true" ? 1 : 0;
-    } else if (type == CMPI_uint16) {
-        value.uint16 = static_cast<CMPIUint16>(number);
-    } else {
-        value.uint32 = number;
-    }
-    return value;
-}
-
-CMPIValue referenceTo(const CMPIObjectPath* target) {
-    CMPIValue value{};
-    value.ref = const_cast<CMPIObjectPath*>(target);
-    return value;
 }
 
 bool samePath(const CMPIObjectPath* left, const CMPIObjectPath* right) {

@@ -93,11 +93,6 @@ std::optional<std::string> keyOf(const CMPIObjectPath* path, const Property& pro
 /** The object that a key refers to; null if there is none. */
 CMPIObjectPath* referenceOf(const CMPIObjectPath* path, const char* key);
 
-/** An integer or boolean as a CMPI value. */
-CMPIValue scalarFrom(const std::string& characters, CMPIType type);
-
-CMPIValue referenceTo(const CMPIObjectPath* target);
-
 /** Sets a property of an instance. Fails if the object manager does. */
 inline void setProperty(const CMPIInstance* instance, const char* name, const CMPIValue* value, CMPIType type) {
     requireOk("set a property", tell<&CMPIInstanceFT::setProperty>(instance, name, value, type));
@@ -118,7 +113,7 @@ bool samePath(const CMPIObjectPath* left, const CMPIObjectPath* right);
  */
 class LocalObject {
 public:
-    /** @param values the keys of a path or the properties of an instance */
+    /** @param itsValues the keys of a path or the properties of an instance */
     LocalObject(std::string itsNameSpace, const Class& itsClass, Values itsValues = {});
     LocalObject(const LocalObject&) = delete;
     LocalObject& operator=(const LocalObject&) = delete;

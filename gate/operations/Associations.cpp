@@ -225,6 +225,12 @@ void giveOfClass(const ClientRequest& request, const char* resultClass, Answers 
     request.give(answers);
 }
 
+CMPIValue referenceTo(const CMPIObjectPath* target) {
+    CMPIValue value{};
+    value.ref = const_cast<CMPIObjectPath*>(target);
+    return value;
+}
+
 const CMPIObjectPath* associationPath(const ClientRequest& request, const AssociationPair& pair) {
     const Class& association = *pair.traversal.association;
     CMPIObjectPath* path = makePath(request.broker(), nameSpaceOf(request.path), association.name);
@@ -235,7 +241,7 @@ const CMPIObjectPath* associationPath(const ClientRequest& request, const Associ
     return path;
 }
 
-/** The instance of an association. Both of its properties are keys, so a property list does not restrict it. */
+/** The instance of an association, regardless of a property list: both of its properties are keys. */
 const CMPIInstance* associationInstance(const ClientRequest& request, const AssociationPair& pair) {
     CMPIInstance* instance = makeInstance(request.broker(), associationPath(request, pair));
     for (const Property& end : *pair.traversal.association) {

@@ -40,10 +40,7 @@ void createInstance(const ClientRequest& request, const CMPIInstance* instance);
 void modifyInstance(const ClientRequest& request, const CMPIInstance* instance, const char** properties);
 void deleteInstance(const ClientRequest& request);
 
-/**
- * Traversals of associations, from the request's path. References have no use for a property list: both properties of
- * an association are keys.
- */
+/** Traversals of associations, from the request's path. References ignore the property list. */
 void associators(const ClientRequest& request, const char* associationClass, const char* resultClass, const char* role,
                  const char* resultRole, const char** properties);
 void associatorNames(const ClientRequest& request, const char* associationClass, const char* resultClass,
