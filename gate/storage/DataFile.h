@@ -42,7 +42,7 @@ struct DataFile {
 
     /** @name Storing a change: begin(), the provider's writing, then commit() or rollBack() */
     ///@{
-    /** Makes the current content restorable. Returns what rollBack() needs; empty if the content is damaged. */
+    /** Makes the content restorable. Returns what rollBack() needs; empty for a damaged record file without a copy. */
     std::string begin(const std::string& content) const;
 
     /**
