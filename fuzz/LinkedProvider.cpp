@@ -26,12 +26,13 @@ void ProviderLibrary::load() {
 
 void ProviderLibrary::unload() {
     handle = nullptr;
+    interfaces = {};
 }
 
-ProviderInterfaces ProviderLibrary::createInterfaces(const CMPIBroker* broker) const {
+void ProviderLibrary::createInterfaces(const CMPIBroker* broker) {
     CMPIStatus status{CMPI_RC_OK, nullptr};
-    return {LeaseAndWarrantyProvider_Create_InstanceMI(broker, nullptr, &status),
-            LeaseAndWarrantyProvider_Create_AssociationMI(broker, nullptr, &status)};
+    interfaces = {LeaseAndWarrantyProvider_Create_InstanceMI(broker, nullptr, &status),
+                  LeaseAndWarrantyProvider_Create_AssociationMI(broker, nullptr, &status)};
 }
 
 }  // namespace gate

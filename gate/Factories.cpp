@@ -70,7 +70,7 @@ struct Entry<Interface, operation> {
         if (!active.isAdmitted) {
             return statusOf(CMPI_RC_ERR_FAILED, shuttingDown);
         }
-        const ClientRequest request{context, result, path, active.generation};
+        const ClientRequest request{context, result, path};
         return guarded([&] { return request.brokerOrNull(); },
                        [&] {
                            request.broker();  // there must be one

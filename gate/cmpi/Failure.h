@@ -16,7 +16,13 @@ struct Failure {
 };
 
 /** Ends a request whose object manager is shutting down or has ended. Its broker must not be used any more. */
-struct ManagerGone {};
+struct ManagerGone {
+    static void throwUnless(bool mayBeUsed) {
+        if (!mayBeUsed) {
+            throw ManagerGone{};
+        }
+    }
+};
 
 /** Ends a request with a status and the message that the parts form. */
 template <class... Parts>

@@ -87,6 +87,20 @@ std::optional<CMPIUint32> numberIn(const std::string& digits, CMPIType type) {
     return error == std::errc() && number <= limit ? std::optional<CMPIUint32>(number) : std::nullopt;
 }
 
+/** An integer or boolean as a CMPI value. */
+CMPIValue scalarFrom(const std::string& characters, CMPIType type) {
+    CMPIValue value{};
+    const CMPIUint32 number = numberIn(characters, type).value_or(0);
+    if (type == CMPI_boolean) {
+        value.boolean = characters == "true" ? 1 : 0;
+    } else if (type == CMPI_uint16) {
+        value.uint16 = static_cast<CMPIUint16>(number);
+    } else {
+        value.uint32 = number;
+    }
+    return value;
+}
+
 /** Whether the second path has that key of the first one. */
 bool sameKey(const CMPIData& key, const char* name, const CMPIObjectPath* other) {
     const auto found = ask<&CMPIObjectPathFT::getKey>(other, name);
@@ -134,25 +148,6 @@ CMPIObjectPath* referenceOf(const CMPIObjectPath* path, const char* key) {
     return isUsable ? answer.value.value.ref : nullptr;
 }
 
-CMPIValue scalarFrom(const std::string& characters, CMPIType type) {
-    CMPIValue value{};
-    const CMPIUint32 number = numberIn(characters, type).value_or(0);
-    if (type == CMPI_boolean) {
-        value.boolean = characters == "true" ? 1 : 0;
-    } else if (type == CMPI_uint16) {
-        value.uint16 = static_cast<CMPIUint16>(number);
-    } else {
-        value.uint32 = number;
-    }
-    return value;
-}
-
-CMPIValue referenceTo(const CMPIObjectPath* target) {
-    CMPIValue value{};
-    value.ref = const_cast<CMPIObjectPath*>(target);
-    return value;
-}
-
 bool samePath(const CMPIObjectPath* left, const CMPIObjectPath* right) {
     const CMPICount count = keyCountOf(left);
     if (count == 0 || count != keyCountOf(right) || !sameName(classNameOf(left), classNameOf(right))) {
@@ -173,10 +168,11 @@ bool samePath(const CMPIObjectPath* left, const CMPIObjectPath* right) {
     return true;
 }
 
-LocalObject::LocalObject(std::string itsNameSpace, const Class& itsClass, const Values& values)
-    : nameSpaceCharacters(std::move(itsNameSpace)), className(itsClass.name) {
+LocalObject::LocalObject(std::string itsNameSpace, const Class& itsClass, Values itsValues)
+    : nameSpaceCharacters(std::move(itsNameSpace)), className(itsClass.name), values(std::move(itsValues)) {
     for (const auto& [property, value] : values) {
-        members.emplace_back(*property, value);
+        const CMPIType type = property->type == CMPI_dateTime ? CMPIType{CMPI_string} : property->type;
+        members.push_back({property->name, type, value});
     }
 }
 

@@ -2,7 +2,6 @@
 
 #include <cmpift.h>
 
-#include <deque>
 #include <optional>
 #include <string>
 #include <utility>
@@ -94,11 +93,6 @@ std::optional<std::string> keyOf(const CMPIObjectPath* path, const Property& pro
 /** The object that a key refers to; null if there is none. */
 CMPIObjectPath* referenceOf(const CMPIObjectPath* path, const char* key);
 
-/** An integer or boolean as a CMPI value. */
-CMPIValue scalarFrom(const std::string& characters, CMPIType type);
-
-CMPIValue referenceTo(const CMPIObjectPath* target);
-
 /** Sets a property of an instance. Fails if the object manager does. */
 inline void setProperty(const CMPIInstance* instance, const char* name, const CMPIValue* value, CMPIType type) {
     requireOk("set a property", tell<&CMPIInstanceFT::setProperty>(instance, name, value, type));
@@ -119,8 +113,8 @@ bool samePath(const CMPIObjectPath* left, const CMPIObjectPath* right);
  */
 class LocalObject {
 public:
-    /** @param values the keys of a path or the properties of an instance */
-    LocalObject(std::string itsNameSpace, const Class& itsClass, const Values& values = {});
+    /** @param itsValues the keys of a path or the properties of an instance */
+    LocalObject(std::string itsNameSpace, const Class& itsClass, Values itsValues = {});
     LocalObject(const LocalObject&) = delete;
     LocalObject& operator=(const LocalObject&) = delete;
 
@@ -131,14 +125,9 @@ public:
 
 private:
     struct Member {
-        Member(const Property& property, std::string itsValue)
-            : name(property.name),
-              type(property.type == CMPI_dateTime ? CMPIType{CMPI_string} : property.type),
-              characters(std::move(itsValue)) {}
-
         const char* name;
         CMPIType type;
-        std::string characters;
+        const std::string& characters;
         StaticString nameString{name};
         StaticString valueString{characters.c_str()};
     };
@@ -155,7 +144,8 @@ private:
     std::string nameSpaceCharacters;
     StaticString nameSpace{nameSpaceCharacters.c_str()};
     StaticString className;
-    std::deque<Member> members{};  ///< whose elements stay where they are
+    const Values values;
+    std::vector<Member> members{};  ///< one per value
     CMPIObjectPath pathHandle{this, &pathFunctions};
     CMPIInstance instanceHandle{this, &instanceFunctions};
 };

@@ -30,10 +30,10 @@ struct Forward<slot> {
 
     static Result call(const CMPIBroker* broker, Arguments... arguments) {
         auto& wrapper = *static_cast<WrappedBroker*>(broker->hdl);
-        const CMPIBroker* manager = wrapper.manager();
+        const CMPIBroker* manager = wrapper.manager;
         const auto function = std::get<Table*>(std::tuple(manager->bft, manager->eft, manager->mft))->*slot;
         if constexpr (std::is_same_v<Table, CMPIBrokerFT>) {
-            const ScopedRelease scopedRelease(wrapper.lock());
+            const ScopedRelease scopedRelease(wrapper.lock);
             return function(manager, arguments...);
         } else if constexpr (makesAnswers) {
             const Result made = function(manager, arguments...);
@@ -85,13 +85,13 @@ CMPIBrokerMemFT wrappedMemory(const CMPIBrokerMemFT* original) {
 
 }  // namespace
 
-WrappedBroker::WrappedBroker(const CMPIBroker* manager, const Lock& lock)
-    : callersLock(lock),
+WrappedBroker::WrappedBroker(const CMPIBroker* itsManager, const Lock& itsLock)
+    : manager(itsManager),
+      lock(itsLock),
       services(wrappedServices(manager->bft)),
       encapsulation(wrappedEncapsulation(manager->eft)),
       memory(wrappedMemory(manager->mft)),
       // The thread functions have no broker parameter, so they are not wrapped.
-      broker{this, &services, &encapsulation, manager->xft, manager->mft == nullptr ? nullptr : &memory},
-      managersOwn(manager) {}
+      broker{this, &services, &encapsulation, manager->xft, manager->mft == nullptr ? nullptr : &memory} {}
 
 }  // namespace gate

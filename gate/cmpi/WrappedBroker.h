@@ -20,27 +20,23 @@ public:
         void (*reacquire)();
     };
 
-    WrappedBroker(const CMPIBroker* manager, const Lock& lock);
+    WrappedBroker(const CMPIBroker* itsManager, const Lock& itsLock);
     WrappedBroker(const WrappedBroker&) = delete;
     WrappedBroker& operator=(const WrappedBroker&) = delete;
 
     const CMPIBroker* handle() const { return &broker; }
 
-    /** The object manager's broker. */
-    const CMPIBroker* manager() const { return managersOwn; }
-
-    const Lock& lock() const { return callersLock; }
+    const CMPIBroker* const manager;  ///< the object manager's broker
+    const Lock lock;
 
     /** Whether a path or instance could not be created. The provider omits such answers without an error. */
     bool hasFailed = false;
 
 private:
-    Lock callersLock;
     CMPIBrokerFT services;
     CMPIBrokerEncFT encapsulation;
     CMPIBrokerMemFT memory;
     CMPIBroker broker;
-    const CMPIBroker* managersOwn;
 };
 
 }  // namespace gate

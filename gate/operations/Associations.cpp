@@ -18,7 +18,7 @@ struct End {
 /** The computers that the object manager knows. */
 using Computers = std::vector<End>;
 
-/** A direction of an association. Without source and target, both. */
+/** A direction of an association. Without source and target, all pairs. */
 struct Traversal {
     const Class* association;
     const Property* source = nullptr;
@@ -34,6 +34,7 @@ struct AssociationPair {
 
 enum class ElementForm { path, instance };
 
+using Traversals = std::vector<Traversal>;
 using Pairs = std::vector<AssociationPair>;
 
 /** Fails unless the computers could be enumerated. Logs the reason, too, since clients often drop it. */
@@ -167,9 +168,11 @@ struct TraversalFilter {
     const char* resultRole;
 };
 
-/** The traversals that begin at the request's path and that the filter admits. */
-std::vector<Traversal> traversalsFrom(const ClientRequest& request, const TraversalFilter& filter) {
-    std::vector<Traversal> traversals;
+/** The traversals that begin at the request's path, which must have keys, and that the filter admits. */
+Traversals traversalsFrom(const ClientRequest& request, const TraversalFilter& filter) {
+    failIf(keyCountOf(request.path) == 0, CMPI_RC_ERR_INVALID_PARAMETER,
+           "Associations begin at an instance: the path needs its keys.");
+    Traversals traversals;
     for (const Class& association : Classes()) {
         if (!association.isAssociation || !matches(filter.associationClass, association.name)) {
             continue;
@@ -187,26 +190,24 @@ std::vector<Traversal> traversalsFrom(const ClientRequest& request, const Traver
 }
 
 /**
- * Returns what `make(request, pair)` makes of each pair at the request's path, in one session.
+ * Returns what `make(request, pair)` makes of each pair of the traversals, in one session.
  * @param form of the elements at the targets of the traversals
  */
 template <class Answers, class Make>
-Answers traverse(const ClientRequest& request, const TraversalFilter& filter, ElementForm form, Make make) {
-    failIf(keyCountOf(request.path) == 0, CMPI_RC_ERR_INVALID_PARAMETER,
-           "Associations begin at an instance: the path needs its keys.");
+Answers traverse(const ClientRequest& request, const Traversals& traversals, ElementForm form, Make make) {
     Answers answers;
-    const std::vector<Traversal> traversals = traversalsFrom(request, filter);
     if (traversals.empty()) {
         return answers;
     }
     ProviderSession session(request);
     const Computers computers = knownComputers(request, session);
     for (const Traversal& traversal : traversals) {
-        const bool isFromComputer = isComputerEnd(*traversal.source);
+        const Property* source = traversal.source;
+        const bool isFromComputer = source != nullptr && isComputerEnd(*source);
         const Pairs pairs = isFromComputer ? pairsOf(session, computerAt(request.path, computers), traversal, form)
                                            : pairsOf(session, computers, traversal);
         for (const AssociationPair& pair : pairs) {
-            if (isFromComputer || samePath(pair.element.path, request.path)) {
+            if (source == nullptr || isFromComputer || samePath(pair.element.path, request.path)) {
                 answers.push_back(make(request, pair));
             }
         }
@@ -224,6 +225,12 @@ void giveOfClass(const ClientRequest& request, const char* resultClass, Answers 
     request.give(answers);
 }
 
+CMPIValue referenceTo(const CMPIObjectPath* target) {
+    CMPIValue value{};
+    value.ref = const_cast<CMPIObjectPath*>(target);
+    return value;
+}
+
 const CMPIObjectPath* associationPath(const ClientRequest& request, const AssociationPair& pair) {
     const Class& association = *pair.traversal.association;
     CMPIObjectPath* path = makePath(request.broker(), nameSpaceOf(request.path), association.name);
@@ -234,7 +241,7 @@ const CMPIObjectPath* associationPath(const ClientRequest& request, const Associ
     return path;
 }
 
-/** The instance of an association. Both of its properties are keys, so a property list does not restrict it. */
+/** The instance of an association, regardless of a property list: both of its properties are keys. */
 const CMPIInstance* associationInstance(const ClientRequest& request, const AssociationPair& pair) {
     CMPIInstance* instance = makeInstance(request.broker(), associationPath(request, pair));
     for (const Property& end : *pair.traversal.association) {
@@ -242,17 +249,6 @@ const CMPIInstance* associationInstance(const ClientRequest& request, const Asso
         setProperty(instance, end.name, &target, CMPI_ref);
     }
     return instance;
-}
-
-/** Returns what `make` makes of all pairs of an association. */
-template <class Answers, class Make>
-Answers allOf(const ClientRequest& request, const Class& association, Make make) {
-    ProviderSession session(request);
-    Answers answers;
-    for (const AssociationPair& pair : pairsOf(session, knownComputers(request, session), {&association})) {
-        answers.push_back(make(request, pair));
-    }
-    return answers;
 }
 
 }  // namespace
@@ -264,8 +260,8 @@ void associators(const ClientRequest& request, const char* associationClass, con
         const PropertySelection selection(properties, *findClass(target.referenceClass));
         return selection.applied(request.broker(), at(target, pair).instance);
     };
-    giveOfClass(request, resultClass,
-                traverse<Instances>(request, {associationClass, role, resultRole}, ElementForm::instance, instanceAt),
+    const Traversals traversals = traversalsFrom(request, {associationClass, role, resultRole});
+    giveOfClass(request, resultClass, traverse<Instances>(request, traversals, ElementForm::instance, instanceAt),
                 pathOf);
 }
 
@@ -274,26 +270,27 @@ void associatorNames(const ClientRequest& request, const char* associationClass,
     const auto targetOf = [](const ClientRequest&, const AssociationPair& pair) {
         return at(*pair.traversal.target, pair).path;
     };
-    giveOfClass(request, resultClass,
-                traverse<Paths>(request, {associationClass, role, resultRole}, ElementForm::path, targetOf),
+    const Traversals traversals = traversalsFrom(request, {associationClass, role, resultRole});
+    giveOfClass(request, resultClass, traverse<Paths>(request, traversals, ElementForm::path, targetOf),
                 [](const CMPIObjectPath* path) { return path; });
 }
 
 void references(const ClientRequest& request, const char* associationClass, const char* role, const char**) {
-    request.give(
-        traverse<Instances>(request, {associationClass, role, nullptr}, ElementForm::path, associationInstance));
+    const Traversals traversals = traversalsFrom(request, {associationClass, role, nullptr});
+    request.give(traverse<Instances>(request, traversals, ElementForm::path, associationInstance));
 }
 
 void referenceNames(const ClientRequest& request, const char* associationClass, const char* role) {
-    request.give(traverse<Paths>(request, {associationClass, role, nullptr}, ElementForm::path, associationPath));
+    const Traversals traversals = traversalsFrom(request, {associationClass, role, nullptr});
+    request.give(traverse<Paths>(request, traversals, ElementForm::path, associationPath));
 }
 
 Instances associationInstances(const ClientRequest& request, const Class& association) {
-    return allOf<Instances>(request, association, associationInstance);
+    return traverse<Instances>(request, {Traversal{&association}}, ElementForm::path, associationInstance);
 }
 
 Paths associationPaths(const ClientRequest& request, const Class& association) {
-    return allOf<Paths>(request, association, associationPath);
+    return traverse<Paths>(request, {Traversal{&association}}, ElementForm::path, associationPath);
 }
 
 const CMPIInstance* associationAt(const ClientRequest& request, const Class& association) {

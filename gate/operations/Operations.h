@@ -28,7 +28,6 @@ public:
 
 private:
     const Class& owner;
-    bool hasList;
     std::vector<const char*> names{};
     bool isComplete;  ///< whether it has all properties of the class
 };
@@ -41,24 +40,17 @@ void createInstance(const ClientRequest& request, const CMPIInstance* instance);
 void modifyInstance(const ClientRequest& request, const CMPIInstance* instance, const char** properties);
 void deleteInstance(const ClientRequest& request);
 
-/**
- * @name Traversals of associations, from the request's path
- * References have no use for a property list: both properties of an association are keys.
- */
-///@{
+/** Traversals of associations, from the request's path. References ignore the property list. */
 void associators(const ClientRequest& request, const char* associationClass, const char* resultClass, const char* role,
                  const char* resultRole, const char** properties);
 void associatorNames(const ClientRequest& request, const char* associationClass, const char* resultClass,
                      const char* role, const char* resultRole);
 void references(const ClientRequest& request, const char* associationClass, const char* role, const char** properties);
 void referenceNames(const ClientRequest& request, const char* associationClass, const char* role);
-///@}
 
-/** @name Answers to reads of an association class */
-///@{
+/** The answers to reads of an association class. */
 Paths associationPaths(const ClientRequest& request, const Class& association);
 Instances associationInstances(const ClientRequest& request, const Class& association);
 const CMPIInstance* associationAt(const ClientRequest& request, const Class& association);
-///@}
 
 }  // namespace gate

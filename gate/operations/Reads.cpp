@@ -5,15 +5,15 @@
 namespace gate {
 
 PropertySelection::PropertySelection(const char** list, const Class& itsClass)
-    : owner(itsClass), hasList(list != nullptr) {
-    for (const char** name = list; hasList && *name != nullptr; ++name) {
+    : owner(itsClass), isComplete(list == nullptr) {
+    for (const char** name = list; list != nullptr && *name != nullptr; ++name) {
         names.push_back(*name);
     }
     isComplete = std::all_of(owner.begin(), owner.end(), [&](const Property& property) { return has(property); });
 }
 
 bool PropertySelection::has(const Property& property) const {
-    return !hasList ||
+    return isComplete ||
            std::any_of(names.begin(), names.end(), [&](const char* name) { return sameName(name, property.name); });
 }
 
@@ -56,10 +56,6 @@ namespace {
 
 // Functions that end the session before its answer is returned.
 
-Paths namesOf(const ClientRequest& request, const Class& requested) {
-    return ProviderSession(request).names(requested);
-}
-
 Instances instancesOf(const ClientRequest& request, const Class& requested, const char** properties) {
     const ProviderSession session(request);
     const PropertySelection selection(properties, requested);
@@ -80,7 +76,9 @@ const CMPIInstance* instanceAt(const ClientRequest& request, const Class& reques
 
 void enumerateInstanceNames(const ClientRequest& request) {
     const Class& requested = request.requestedClass();
-    request.give(requested.isAssociation ? associationPaths(request, requested) : namesOf(request, requested));
+    const Paths paths =
+        requested.isAssociation ? associationPaths(request, requested) : ProviderSession(request).names(requested);
+    request.give(paths);  // after the session
 }
 
 void enumerateInstances(const ClientRequest& request, const char** properties) {

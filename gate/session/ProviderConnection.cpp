@@ -27,13 +27,17 @@ constexpr std::chrono::milliseconds pollInterval{10};
 /** How long a request waits for newer records if it may use older ones. A file's time has a resolution of 10 ms. */
 constexpr std::chrono::milliseconds newerTimeout{50};
 
-/** Releases the lock while the condition holds, but not much longer than the timeout. */
+/** Releases the lock while the condition is true, but not much longer than the timeout. Returns the condition. */
 template <class Condition>
-void waitWhile(LockGuard& guard, std::chrono::milliseconds timeout, Condition condition) {
+bool waitWhile(LockGuard& guard, std::chrono::milliseconds timeout, Condition condition) {
     const auto end = std::chrono::steady_clock::now() + timeout;
-    while (condition() && std::chrono::steady_clock::now() < end) {
+    while (condition()) {
+        if (std::chrono::steady_clock::now() >= end) {
+            return true;
+        }
         guard.releaseFor([] { std::this_thread::sleep_for(pollInterval); });
     }
+    return false;
 }
 
 /** Keeps this library and its dependencies in the process, for a request that is still running in them. */
@@ -79,11 +83,9 @@ ProviderConnection theConnection;
 static ShutdownAtExit shutdownAtExit;  // destroyed before the objects above
 
 void ProviderConnection::connect(const CMPIBroker* manager) {
-    const bool isOpen = theRequestLock.open();
+    theRequestLock.open();
     const ActiveRequest active;
-    if (!isOpen) {
-        throw ManagerGone{};
-    }
+    ManagerGone::throwUnless(active.isAdmitted);
     if (isConnectedTo(manager)) {
         return;
     }
@@ -99,7 +101,7 @@ void ProviderConnection::connect(const CMPIBroker* manager) {
     wrapped.emplace(manager, WrappedBroker::Lock{beginUpCall, endUpCall});
     try {
         if (library.isLoaded()) {
-            createInterfaces();
+            library.createInterfaces(wrapped->handle());
         } else {
             load();  // if the files are being written, again at the first request
         }
@@ -120,21 +122,16 @@ void ProviderConnection::requireOwner(LockGuard& guard) {
 }
 
 void ProviderConnection::requireCurrent(LockGuard& guard, bool mayBeOlder) {
-    bool isWaiting = false;
-    const auto update = [&] {
+    const auto isWaiting = [&] {
         const bool needsLoading = isOutdated || !library.isLoaded() || theDirectory.isOutdated();
-        return isWaiting = needsLoading && (upCalls != 0 || !load());
+        return needsLoading && (upCalls != 0 || !load());
     };
-    waitWhile(guard, newerTimeout, update);
-    const bool mayUseOlder = mayBeOlder && library.isLoaded() && !isOutdated;
-    if (isWaiting && !mayUseOlder) {
-        waitWhile(guard, waitTimeout, update);
+    const auto mayUseOlder = [&] { return mayBeOlder && library.isLoaded() && !isOutdated; };
+    if (waitWhile(guard, newerTimeout, isWaiting) && !mayUseOlder() && waitWhile(guard, waitTimeout, isWaiting)) {
+        fail(CMPI_RC_ERR_FAILED,
+             upCalls != 0 ? "The provider waits for the object manager and cannot be loaded again. Try again."
+                          : "The record files are incomplete, or another process is writing them. Try again.");
     }
-    const bool isRefused = isWaiting && !mayUseOlder;
-    failIf(isRefused && upCalls != 0, CMPI_RC_ERR_FAILED,
-           "The provider waits for the object manager and cannot be loaded again. Try again.");
-    failIf(isRefused, CMPI_RC_ERR_FAILED,
-           "The record files are incomplete, or another process is writing them. Try again.");
 }
 
 /**
@@ -148,15 +145,15 @@ bool ProviderConnection::load() {
         return false;  // a request may read the older tables
     }
     isOutdated = true;
-    unload();
-    counts = theDirectory.recordCounts();
+    library.unload();
+    const auto counts = theDirectory.recordCounts();
     library.load();
     shutdownAtExit.registerAgain();
     if (!theDirectory.hasChanged()) {
-        createInterfaces();
+        library.createInterfaces(wrapped->handle());
         isOutdated = false;
-        for (Table& table : tables) {
-            table = {table.name};
+        for (std::size_t index = 0; index < tables.size(); ++index) {
+            tables[index] = {tables[index].name, counts[index]};
         }
     }
     return !isOutdated;
@@ -167,27 +164,15 @@ void ProviderConnection::requireRead(const Class& owner, std::size_t count) {
     if (table == nullptr || table->isRead) {
         return;
     }
-    const auto index = static_cast<std::size_t>(table - tables.data());
-    if (!counts[index]) {  // the gate could not read the file, but the provider may have
-        counts[index] = theDirectory.recordCounts()[index];
+    if (!table->count) {  // the gate could not read the file, but the provider may have
+        table->count = theDirectory.recordCounts()[static_cast<std::size_t>(table - tables.data())];
     }
-    if (count != counts[index]) {
+    if (count != table->count) {
         setOutdated();
         fail(CMPI_RC_ERR_FAILED, "The provider could not read the records of ", owner.name,
              "; see the agent's log at level 3000. It reads them again; repeat the request.");
     }
     table->isRead = true;
-}
-
-void ProviderConnection::unload() {
-    providers = {};
-    library.unload();
-}
-
-void ProviderConnection::createInterfaces() {
-    providers = library.createInterfaces(wrapped->handle());
-    failIf(providers.instances == nullptr || providers.associations == nullptr, CMPI_RC_ERR_FAILED,
-           "The provider did not return its interfaces.");
 }
 
 const CMPIBroker* ProviderConnection::broker() const {
@@ -198,7 +183,8 @@ const CMPIBroker* ProviderConnection::broker() const {
 void ProviderConnection::shutdown(const CMPIContext* context) {
     std::exception_ptr failure;
     theRequestLock.close(drainTimeout, RequestLock::Closing::temporary, [&] {
-        const auto [instances, associations] = providers;
+        auto* const instances = library.interface<CMPIInstanceMI>();
+        auto* const associations = library.interface<CMPIAssociationMI>();
         try {
             if (broker() != nullptr && instances != nullptr && associations != nullptr) {
                 instances->ft->cleanup(instances, context, 1);
@@ -232,7 +218,7 @@ void ProviderConnection::set(const CMPIBroker* manager) {
 
 void ProviderConnection::endProcess() {
     if (upCalls == 0) {
-        unload();
+        library.unload();
         theDirectory.close();
     }
 }

@@ -4,6 +4,7 @@
 #include <cstddef>
 #include <mutex>
 #include <optional>
+#include <tuple>
 
 #include "RequestLock.h"
 #include "durable/RecordFile.h"
@@ -11,12 +12,6 @@
 #include "gate/cmpi/WrappedBroker.h"
 
 namespace gate {
-
-/** The provider's interfaces. Null if it has returned none. */
-struct ProviderInterfaces {
-    CMPIInstanceMI* instances = nullptr;
-    CMPIAssociationMI* associations = nullptr;
-};
 
 /**
  * The provider's shared library, in the directory of this one. It is not linked: the provider reads its record files
@@ -32,14 +27,21 @@ public:
      */
     void load();
 
-    /** Unloads the library if it is loaded. */
+    /** Unloads the library if it is loaded. It has no interfaces then. */
     void unload();
 
-    /** Calls the factories, while it is loaded. */
-    ProviderInterfaces createInterfaces(const CMPIBroker* broker) const;
+    /** Calls the factories, while it is loaded. Fails with CMPI_RC_ERR_FAILED unless both return an interface. */
+    void createInterfaces(const CMPIBroker* broker);
+
+    /** The provider's interface of a type; null if there is none. */
+    template <class Interface>
+    Interface* interface() const {
+        return std::get<Interface*>(interfaces);
+    }
 
 private:
     void* handle = nullptr;
+    std::tuple<CMPIInstanceMI*, CMPIAssociationMI*> interfaces{};
 };
 
 /** The process's only connection between the provider and an object manager. Loads and unloads the provider. */
@@ -47,8 +49,9 @@ class ProviderConnection {
 public:
     /** The provider's table of a record file. */
     struct Table {
-        const char* name;         ///< of the class
-        bool isRead = false;      ///< whether it is known that the provider has read the file
+        const char* name;                    ///< of the class
+        std::optional<std::size_t> count{};  ///< of the file's records when the provider was loaded
+        bool isRead = false;                 ///< whether it is known that the provider has read the file
         bool isVerified = false;  ///< whether it has been compared with the file since the provider was loaded
     };
 
@@ -74,7 +77,7 @@ public:
     /** @name Callable with the request lock held, while there is a broker */
     ///@{
     WrappedBroker& wrappedBroker() { return *wrapped; }
-    const ProviderInterfaces& interfaces() const { return providers; }
+    const ProviderLibrary& provider() const { return library; }
 
     /**
      * Ensures that this process owns the data directory, for a change. Releases the lock until another owner ends.
@@ -105,18 +108,14 @@ public:
 
 private:
     bool load();
-    void unload();
-    void createInterfaces();
     bool isConnectedTo(const CMPIBroker* manager) const;
     void set(const CMPIBroker* manager);
 
     ProviderLibrary library{};
     bool isOutdated = false;
     std::array<Table, durable::recordFileCount> tables{Table{"VELKO_Lease"}, Table{"VELKO_Warranty"}};  ///< by file
-    std::array<std::optional<std::size_t>, durable::recordFileCount> counts{};  ///< when the provider was loaded
     std::size_t upCalls = 0;  ///< requests in the provider that have released the lock
     std::optional<WrappedBroker> wrapped{};
-    ProviderInterfaces providers{};
     mutable std::mutex mutex{};  ///< of the members below, for callers without the request lock
     const CMPIBroker* managersOwn = nullptr;
     CMPIBroker brokersTables{};  ///< a copy of the broker, made when the provider was connected

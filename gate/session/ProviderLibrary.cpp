@@ -47,11 +47,15 @@ void ProviderLibrary::unload() {
         dlclose(handle);
         handle = nullptr;
     }
+    interfaces = {};
 }
 
-ProviderInterfaces ProviderLibrary::createInterfaces(const CMPIBroker* broker) const {
-    return {callFactory<CMPIInstanceMI>(handle, "LeaseAndWarrantyProvider_Create_InstanceMI", broker),
-            callFactory<CMPIAssociationMI>(handle, "LeaseAndWarrantyProvider_Create_AssociationMI", broker)};
+void ProviderLibrary::createInterfaces(const CMPIBroker* broker) {
+    interfaces = {callFactory<CMPIInstanceMI>(handle, "LeaseAndWarrantyProvider_Create_InstanceMI", broker),
+                  callFactory<CMPIAssociationMI>(handle, "LeaseAndWarrantyProvider_Create_AssociationMI", broker)};
+    const auto [instances, associations] = interfaces;
+    failIf(instances == nullptr || associations == nullptr, CMPI_RC_ERR_FAILED,
+           "The provider did not return its interfaces.");
 }
 
 }  // namespace gate

@@ -1,7 +1,5 @@
 #include "ProviderSession.h"
 
-#include <algorithm>
-
 namespace gate {
 
 namespace {
@@ -21,19 +19,13 @@ void giveAll(const ClientRequest& request, const std::vector<Answer>& answers) {
     requireOk(task, tell<&CMPIResultFT::returnDone>(request.result));
 }
 
-[[noreturn]] void failUnfinished() {
-    fail(CMPI_RC_ERR_FAILED, "The provider did not finish its answer; see the agent's log at level 3000.");
+void requireFinished(bool isFinished) {
+    failIf(!isFinished, CMPI_RC_ERR_FAILED,
+           "The provider did not finish its answer; see the agent's log at level 3000.");
 }
 
 const CMPIInstance* firstOf(const Instances& instances) {
     return instances.empty() ? nullptr : instances.front();
-}
-
-/** Whether an instance has the keys of a path. */
-bool hasKeys(const CMPIInstance* instance, const CMPIObjectPath* path, const Class& owner) {
-    return std::all_of(owner.begin(), owner.end(), [&](const Property& property) {
-        return !property.isKey || propertyOf(instance, property) == keyOf(path, property);
-    });
 }
 
 constexpr CMPIStatus done{CMPI_RC_OK, nullptr};
@@ -70,14 +62,10 @@ CMPIResultFT collectorFunctions{
     nullptr,
 };
 
-template <class Function>
-CMPIInstanceMI* interfaceOf(Function CMPIInstanceMIFT::*) {
-    return theConnection.interfaces().instances;
-}
-
-template <class Function>
-CMPIAssociationMI* interfaceOf(Function CMPIAssociationMIFT::*) {
-    return theConnection.interfaces().associations;
+/** The provider's interface that has a function of this type. */
+template <class Table, class Interface, class... Arguments>
+Interface* interfaceOf(CMPIStatus (*Table::*)(Interface*, Arguments...)) {
+    return theConnection.provider().interface<Interface>();
 }
 
 /** Calls a function of one of the provider's interfaces. */
@@ -102,9 +90,7 @@ template <auto function, class... Arguments>
 ProviderAnswer read(const ClientRequest& request, const LocalObject& path, Arguments... arguments) {
     ProviderAnswer answer = call<function>(request, path, arguments...);
     require(!theConnection.wrappedBroker().hasFailed, "create the paths and instances of the answer");
-    if (!answer.isDone) {
-        failUnfinished();
-    }
+    requireFinished(answer.isDone);
     return answer;
 }
 
@@ -112,9 +98,7 @@ ProviderAnswer read(const ClientRequest& request, const LocalObject& path, Argum
 
 const CMPIBroker* ClientRequest::broker() const {
     const CMPIBroker* found = brokerOrNull();
-    if (found == nullptr) {
-        throw ManagerGone{};
-    }
+    ManagerGone::throwUnless(found != nullptr);
     return found;
 }
 
@@ -150,10 +134,7 @@ Paths ProviderSession::names(const Class& owner) const {
     return paths;
 }
 
-/**
- * Fails unless the provider has read the records of a class, or of both classes that an association connects. Lists
- * them once after the provider was loaded.
- */
+/** Fails unless the provider has read the records of a class, or of both classes that an association connects. */
 void ProviderSession::requireRead(const Class& owner) const {
     for (const Property& property : owner) {
         if (property.referenceClass != nullptr) {
@@ -187,7 +168,7 @@ const CMPIInstance* ProviderSession::find(const LocalObject& keys, const Class& 
     if (sameName(owner.name, agentClass)) {
         // A get does not end its answer for other keys than the only instance's, as after an error.
         const CMPIInstance* agent = firstOf(instances(owner));
-        return agent != nullptr && hasKeys(agent, keys.path(), owner) ? agent : nullptr;
+        return agent != nullptr && samePath(pathOf(agent), keys.path()) ? agent : nullptr;
     }
     requireRead(owner);
     return firstOf(read<&CMPIInstanceMIFT::getInstance>(request, keys, allProperties).instances);
@@ -203,9 +184,7 @@ const CMPIInstance* ProviderSession::create(const LocalObject& keys) {
     // The provider ignores the instance.
     const CMPIInstance* created =
         firstOf(read<&CMPIInstanceMIFT::createInstance>(request, keys, keys.instance()).instances);
-    if (created == nullptr) {
-        failUnfinished();
-    }
+    requireFinished(created != nullptr);
     return created;
 }
 

@@ -16,16 +16,12 @@ struct ClientRequest {
     const CMPIContext* context;
     const CMPIResult* result;
     const CMPIObjectPath* path;
-    std::size_t generation;  ///< of the request lock when the request began
+    std::size_t generation = theRequestLock.generation();  ///< when the request began
 
     bool hasManager() const { return theRequestLock.generation() == generation; }
 
     /** Throws ManagerGone if the object manager has ended. Called before each of its functions. */
-    void requireManager() const {
-        if (!hasManager()) {
-            throw ManagerGone{};
-        }
-    }
+    void requireManager() const { ManagerGone::throwUnless(hasManager()); }
 
     /** The broker that the latest factory call received. Throws ManagerGone if there is none. */
     const CMPIBroker* broker() const;
@@ -37,14 +33,11 @@ struct ClientRequest {
     const Class& requestedClass() const;
 
     /**
-     * @name Returns the answers to the client and ends
-     * Called when all answers exist, so that a request that fails returns none. Fails if the object manager does not
-     * accept one.
+     * Returns the answers to the client and ends. Called when all answers exist, so that a request that fails returns
+     * none. Fails if the object manager does not accept one.
      */
-    ///@{
     void give(const Instances& instances) const;
     void give(const Paths& paths) const;
-    ///@}
 };
 
 /**
@@ -65,17 +58,13 @@ public:
     /** Begins the session. For a change, this process must own the data directory. */
     explicit ProviderSession(const ClientRequest& itsRequest, Access access = Access::read);
 
-    /** @name All instances of a class, in the request's namespace */
-    ///@{
+    /** All instances of a class, in the request's namespace. */
     Paths names(const Class& owner) const;
     Instances instances(const Class& owner) const;
-    ///@}
 
-    /** @name The leases or warranties of a computer, whose path has its keys */
-    ///@{
+    /** The leases or warranties of a computer, whose path has its keys. */
     Paths associatorNames(const LocalObject& computer, const Class& association) const;
     Instances associators(const LocalObject& computer, const Class& association) const;
-    ///@}
 
     /** The instance with the keys; null if there is none. */
     const CMPIInstance* find(const LocalObject& keys, const Class& owner) const;

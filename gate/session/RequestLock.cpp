@@ -77,16 +77,13 @@ bool RequestLock::reacquire(std::size_t itsGeneration) noexcept {
 }
 
 bool RequestLock::waitForLock(std::unique_lock<std::mutex>& lock, IfClosed ifClosed) {
-    const bool canWait = state != State::closed || ifClosed == IfClosed::wait;
-    if (canWait && (isHeld || state == State::closed)) {
-        Waiter self;
-        self.ifClosed = ifClosed;
+    if (isHeld || state == State::closed) {
+        Waiter self{ifClosed};
         linkTo(nullptr, waiters) = &self;
         self.wakeUp.wait(lock, [&] { return self.result != Waiter::Result::none; });
         isHeldHere = self.result == Waiter::Result::admitted;
     } else {
-        isHeldHere = canWait;
-        isHeld = isHeld || canWait;
+        isHeld = isHeldHere = true;
     }
     return isHeldHere;
 }
@@ -148,11 +145,9 @@ bool RequestLock::close(std::chrono::milliseconds drainTimeout, Closing closing,
         return false;
     }
     const bool wasHeld = std::exchange(isHeld, true);  // no other closer and no returning request acquires it
-    if (atEnd) {
-        lock.unlock();
-        atEnd();
-        lock.lock();
-    }
+    lock.unlock();
+    atEnd();
+    lock.lock();
     isHeld = wasHeld;
     state = State::closed;
     ++timesClosed;

@@ -55,8 +55,9 @@ public:
      * @param atEnd called just before the lock is closed, while no other thread holds it; must not throw
      * @return whether this call has closed the lock
      */
-    bool close(std::chrono::milliseconds drainTimeout, Closing closing = Closing::temporary,
-               const std::function<void()>& atEnd = nullptr) noexcept;
+    bool close(
+        std::chrono::milliseconds drainTimeout, Closing closing = Closing::temporary,
+        const std::function<void()>& atEnd = [] {}) noexcept;
 
     /** Opens a closed lock. @return whether it is open now: it is not while closing, or if closed permanently */
     bool open() noexcept;
@@ -82,7 +83,7 @@ private:
     std::size_t count(Waiter* const& first) const noexcept;
 
     mutable std::mutex mutex{};
-    std::atomic<State> state{State::open};  ///< changed with the mutex locked
+    State state = State::open;
     std::atomic<std::size_t> timesClosed{0};
     bool isPermanent = false;
     bool isHeld = false;
@@ -108,7 +109,6 @@ public:
     ActiveRequest& operator=(const ActiveRequest&) = delete;
 
     const bool isAdmitted;
-    const std::size_t generation = theRequestLock.generation();
 };
 
 /** Disables the cancellation of the calling thread, which would end the process or leave a file incomplete. */
@@ -126,39 +126,27 @@ private:
 /** Holds the lock. The constructor throws ManagerGone if the lock is closing. */
 class LockGuard {
 public:
-    LockGuard() : isHeld(theRequestLock.acquire()) { requireHeld(); }
+    LockGuard() : isHeld(theRequestLock.acquire()) { ManagerGone::throwUnless(isHeld); }
     ~LockGuard() {
         if (isHeld) {
             theRequestLock.release();
         }
     }
 
-    /** Releases the lock for some work. Throws ManagerGone, without the lock, if it was closed meanwhile. */
+    /**
+     * Releases the lock for some work. Throws ManagerGone if it was closed meanwhile. After this and other exceptions,
+     * the lock stays released.
+     */
     template <class Work>
     void releaseFor(Work work) {
         theRequestLock.release();
         isHeld = false;
-        try {
-            work();
-        } catch (...) {
-            reacquire();
-            throw;
-        }
-        reacquire();
+        work();
+        isHeld = theRequestLock.reacquire(generation);
+        ManagerGone::throwUnless(isHeld);
     }
 
 private:
-    void reacquire() {
-        isHeld = theRequestLock.reacquire(generation);
-        requireHeld();
-    }
-
-    void requireHeld() const {
-        if (!isHeld) {
-            throw ManagerGone{};
-        }
-    }
-
     CancellationDisabled cancellationDisabled;
     bool isHeld;
     const std::size_t generation = theRequestLock.generation();  ///< cannot change while the lock is held

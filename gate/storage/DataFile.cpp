@@ -5,11 +5,8 @@
 #include <unistd.h>
 
 #include <algorithm>
-#include <cctype>
 #include <cerrno>
 #include <filesystem>
-#include <sstream>
-#include <string_view>
 #include <system_error>
 
 #include "KO/PlatformUtilities.h"
@@ -29,8 +26,8 @@ std::string pathOf(const DataFile& file) {
     return std::string(KO::PlatformUtilities::getKelsaDataDir()) + file.fileName;
 }
 
-[[noreturn]] void failToStore(const std::string& path, const std::string& reason) {
-    fail(CMPI_RC_ERR_FAILED, "The change cannot be stored in ", path, ": ", reason, ".");
+void failToStoreIf(bool isFailure, const std::string& path, const char* reason) {
+    failIf(isFailure, CMPI_RC_ERR_FAILED, "The change cannot be stored in ", path, ": ", reason, ".");
 }
 
 /** Fails if the file exists and cannot be written or is not a regular file. */
@@ -45,9 +42,7 @@ void requireWritableFile(const std::string& path) {
     struct stat status {};
     const bool isRegular = fstat(descriptor, &status) == 0 && S_ISREG(status.st_mode);
     close(descriptor);
-    if (!isRegular) {
-        failToStore(path, "it is not a regular file");
-    }
+    failToStoreIf(!isRegular, path, "it is not a regular file");
 }
 
 /** Whether the file system has room for the file's growth and for a block that is partly used. */
@@ -60,16 +55,11 @@ bool hasRoom(const std::string& directory, std::size_t growth) {
     return growth == 0 || !isKnown || room > growth + block;
 }
 
-/** Whether the provider splits a record file at a character. */
-bool isSpace(char each) {
-    return std::string_view(" \t\n\v\f\r").find(each) != std::string_view::npos;
-}
-
-/** Whether a line of a record file is the identifier, and the provider reads it as one. */
+/** Whether a line of a record file is the identifier, and the provider does not split it. */
 bool hasRecord(const std::string& content, std::string identifier) {
     std::replace(identifier.begin(), identifier.end(), ' ', '_');
-    return std::none_of(identifier.begin(), identifier.end(), isSpace) &&
-           ('\n' + content).find('\n' + identifier + '\n') != std::string::npos;
+    return identifier.find_first_of("\t\n\v\f\r") == std::string::npos &&
+           content.find('\n' + identifier + '\n') != std::string::npos;
 }
 
 }  // namespace
@@ -81,12 +71,11 @@ durable::RecordFile DataFile::records() const {
 void DataFile::requireWritable(std::size_t growth) const {
     const std::string path = pathOf(*this);
     const std::string directory = KO::PlatformUtilities::getKelsaDataDir();
+    const std::string subject = path + ": the data directory " + directory;
     requireWritableFile(path);
     // A rollback and the change of a property file replace the file.
     if (access(directory.c_str(), W_OK | X_OK) != 0) {
-        const int error = errno;
-        const std::string subject = "the data directory " + directory;
-        throw std::system_error(error, std::generic_category(), path + ": " + subject);
+        throw std::system_error(errno, std::generic_category(), subject);
     }
     if (!hasRoom(directory, growth)) {
         throw std::system_error(ENOSPC, std::generic_category(), path);
@@ -103,30 +92,11 @@ FileState DataFile::state() const {
 
 bool DataFile::mayHave(const std::string& content, std::string identifier) const {
     std::replace(identifier.begin(), identifier.end(), ' ', '_');
-    const auto isWord = [&](std::size_t start) {
-        const std::size_t end = start + identifier.size();
-        const bool isEnded = end == content.size() || isSpace(content[end]);
-        // A word also begins after a number that is followed by other characters.
-        return isEnded && (start == 0 || isSpace(content[start - 1]) ||
-                           std::isdigit(static_cast<unsigned char>(content[start - 1])) != 0);
-    };
-    std::size_t found = content.find(identifier);
-    while (found != std::string::npos && !isWord(found)) {
-        found = content.find(identifier, found + 1);
-    }
-    return found != std::string::npos || !records().isComplete(content);
+    return content.find(identifier) != std::string::npos || !records().isComplete(content);
 }
 
-std::string DataFile::firstIdentifier(const std::string& content) {
-    std::istringstream words(content);
-    std::string identifier;
-    words >> identifier >> identifier;
-    std::replace(identifier.begin(), identifier.end(), '_', ' ');
-    return words ? identifier : std::string();
-}
-
-void DataFile::begin(FileState& before) const {
-    before.restorable = hasRecords ? records().prepare(before.content) : before.content;
+std::string DataFile::begin(const std::string& content) const {
+    return hasRecords ? records().prepare(content) : content;
 }
 
 void DataFile::commit(const FileState& before, bool mustDiffer, const std::string* identifier) const {
@@ -134,26 +104,23 @@ void DataFile::commit(const FileState& before, bool mustDiffer, const std::strin
         return;
     }
     const FileState now = state();
-    failIf(mustDiffer && now == before, CMPI_RC_ERR_FAILED, fileName, " was not written.");
+    const bool isSame = now.modified == before.modified && now.content == before.content;
+    failIf(mustDiffer && isSame, CMPI_RC_ERR_FAILED, fileName, " was not written.");
     const durable::RecordFile file = records();
-    if (!file.isComplete(now.content)) {
-        failToStore(file.path(), "it does not hold all records; the disk may be full");
-    }
+    failToStoreIf(!file.isComplete(now.content), file.path(), "it does not hold all records; the disk may be full");
     if (identifier != nullptr && !hasRecord(now.content, *identifier)) {
         fail(CMPI_RC_ERR_FAILED, fileName, " does not hold ", *identifier, ".");
     }
     file.commit(now.content);
 }
 
-void DataFile::rollBack(const FileState& before) const {
-    if (hasRecords && before.restorable.empty()) {
-        failToStore(pathOf(*this), "it was damaged before, and there is no saved copy");
-    }
+void DataFile::rollBack(const std::string& before) const {
+    failToStoreIf(hasRecords && before.empty(), pathOf(*this), "it was damaged before, and there is no saved copy");
     if (hasRecords) {
-        records().restore(before.restorable);
-    } else if (!(state() == before)) {
+        records().restore(before);
+    } else if (state().content != before) {
         const std::string path = std::filesystem::canonical(pathOf(*this));  // replaces the target of a link
-        durable::replaceFile(path, before.content, path);
+        durable::replaceFile(path, before, path);
         durable::syncDirectoryOf(path);
     }
 }

@@ -13,9 +13,6 @@ namespace gate {
 struct FileState {
     std::string content;  ///< empty if the file does not exist
     std::filesystem::file_time_type modified{};
-    std::string restorable{};  ///< content for rollBack(); empty if it is unknown
-
-    bool operator==(const FileState& other) const { return modified == other.modified && content == other.content; }
 };
 
 /**
@@ -40,16 +37,13 @@ struct DataFile {
 
     durable::RecordFile records() const;
 
-    /** Whether a record may have the identifier: the record file is incomplete, or a word of it is the identifier. */
+    /** Whether a record may have the identifier: the record file is incomplete or contains the identifier. */
     bool mayHave(const std::string& content, std::string identifier) const;
-
-    /** The identifier of the first record; empty if there is none. */
-    static std::string firstIdentifier(const std::string& content);
 
     /** @name Storing a change: begin(), the provider's writing, then commit() or rollBack() */
     ///@{
-    /** Makes the current state restorable. */
-    void begin(FileState& before) const;
+    /** Makes the content restorable. Returns what rollBack() needs; empty for a damaged record file without a copy. */
+    std::string begin(const std::string& content) const;
 
     /**
      * Syncs the file and the saved copy. Fails if the file is incomplete, or must differ from a state but does not.
@@ -57,8 +51,8 @@ struct DataFile {
      */
     void commit(const FileState& before, bool mustDiffer, const std::string* identifier = nullptr) const;
 
-    /** Restores the file to the state that was passed to begin(). */
-    void rollBack(const FileState& before) const;
+    /** Restores the content. @param before the result of begin() */
+    void rollBack(const std::string& before) const;
     ///@}
 };
 

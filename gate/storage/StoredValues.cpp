@@ -32,11 +32,9 @@ std::string storedValue(const Property& property, const std::string& returned) {
 }
 
 /** The datetime with the offset "-000", if it is zero: "+000" is equal. */
-std::string normalized(const std::string& dateTime) {
-    constexpr std::string_view zero = "+000";
-    const std::size_t offset = cim::noDate.size() - zero.size();
-    const bool hasPlus = dateTime.size() == offset + zero.size() && dateTime.compare(offset, zero.size(), zero) == 0;
-    return hasPlus ? dateTime.substr(0, offset) + "-000" : dateTime;
+std::string normalized(std::string dateTime) {
+    const std::size_t plus = dateTime.find("+000");
+    return plus == std::string::npos ? dateTime : dateTime.replace(plus, 1, "-");
 }
 
 /** The value as object managers pass it on: without blanks, and under some without non-ASCII letters, at its ends. */

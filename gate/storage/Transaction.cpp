@@ -2,14 +2,11 @@
 
 #include <algorithm>
 #include <exception>
-#include <iterator>
 #include <system_error>
 
 namespace gate {
 
 namespace {
-
-constexpr const char* identifierKey = "InstanceID";
 
 /** The most bytes that values take in a file. */
 std::size_t sizeOf(const Values& values) {
@@ -42,36 +39,33 @@ FileState Transaction::open(std::size_t growth) const {
 }
 
 /**
- * Calls `change(before)`, which makes a change, checks it and commits it. If it fails, rolls the change back and passes
+ * Calls `change()`, which makes a change, checks it and commits it. If it fails, rolls the change back and passes
  * the failure on, with a note if the file could not be restored.
  */
 template <class Change>
-void Transaction::run(FileState before, Change change) const {
-    onFiles([&] { file.begin(before); });
+void Transaction::run(const FileState& before, Change change) const {
+    const std::string restorable = onFiles([&] { return file.begin(before.content); });
     try {
-        onFiles([&] { change(before); });
+        onFiles(change);
     } catch (Failure& failure) {
-        failure.message += rollBack(before);
+        failure.message += rollBack(restorable);
         throw;
     } catch (const std::exception& exception) {
-        const std::string note = rollBack(before);
-        if (note.empty()) {
-            throw;
-        }
-        fail(CMPI_RC_ERR_FAILED, "The request failed: ", exception.what(), ".", note);
+        const std::string note = rollBack(restorable);
+        fail(CMPI_RC_ERR_FAILED, "The request failed: ", exception.what(), note.empty() ? "" : ".", note);
     } catch (...) {
-        rollBack(before);
+        rollBack(restorable);
         throw;
     }
 }
 
 /** Restores the file and lets the provider read it again. Returns a note for the client if the file is not restored. */
-std::string Transaction::rollBack(const FileState& before) const {
+std::string Transaction::rollBack(const std::string& restorable) const {
     try {
-        if (file.hasRecords && !before.restorable.empty()) {
+        if (file.hasRecords && !restorable.empty()) {
             theConnection.setOutdated();
         }
-        onFiles([&] { file.rollBack(before); });
+        onFiles([&] { file.rollBack(restorable); });
         return {};
     } catch (const Failure& failure) {
         return " The change could not be rolled back. " + failure.message;
@@ -81,13 +75,13 @@ std::string Transaction::rollBack(const FileState& before) const {
 }
 
 void Transaction::create(const std::string& identifier, const Values& given, const std::function<void()>& returnPath) {
-    requireRoundTrip(file, {{cim::findNamed(owner, identifierKey), identifier}});
+    requireRoundTrip(file, {{cim::findNamed(owner, "InstanceID"), identifier}});
     requireRoundTrip(file, given);
-    const FileState start = open(identifier.size() + 1 + sizeOf(given));
-    const bool exists = file.mayHave(start.content, identifier) && session.find(path, owner) != nullptr;
+    const FileState before = open(identifier.size() + 1 + sizeOf(given));
+    const bool exists = file.mayHave(before.content, identifier) && session.find(path, owner) != nullptr;
     failIf(exists, CMPI_RC_ERR_ALREADY_EXISTS, owner.name, " ", identifier, " already exists.");
-    requireReadOnlyValues(given, start.content);
-    run(start, [&](const FileState& before) {
+    requireReadOnlyValues(given);
+    run(before, [&] {
         const CMPIInstance* current = session.create(path);
         const Values changes = diff(current, given, false);
         const FileState created = altersFile(file, current, changes) ? file.state() : before;
@@ -101,14 +95,16 @@ void Transaction::create(const std::string& identifier, const Values& given, con
 
 void Transaction::modify(const CMPIInstance* current, const Values& changes) {
     requireRoundTrip(file, changes);
-    run(open(sizeOf(changes)), [&](const FileState& before) {
+    const FileState before = open(sizeOf(changes));
+    run(before, [&] {
         apply(current, changes);
         file.commit(before, altersFile(file, current, changes));
     });
 }
 
 void Transaction::remove() {
-    run(open(0), [&](const FileState& before) {
+    const FileState before = open(0);
+    run(before, [&] {
         session.remove(path);
         file.commit(before, true);
     });
@@ -120,10 +116,7 @@ void Transaction::apply(const CMPIInstance* current, const Values& changes) cons
     requireChanged(owner, file, current, session.get(path, owner), changes);
 }
 
-/**
- * Fails if the provider does not have as many records as its file, so that its next write would lose some: it does not
- * report that it could not read the file.
- */
+/** Fails if the provider has not as many records as its file, so that its next write would lose some. */
 void Transaction::requireTable() const {
     if (!file.hasRecords || (theConnection.tableOf(owner)->isVerified && file.records().isStored())) {
         return;
@@ -153,26 +146,13 @@ void Transaction::storeTable(const CMPIObjectPath* record) const {
     file.commit({}, true);
 }
 
-/** A record of the file; null if it has none. Lists the names only if it has lost the first record's identifier. */
-const CMPIInstance* Transaction::anyRecord(const std::string& content) const {
-    const std::string identifier = DataFile::firstIdentifier(content);
-    if (identifier.empty()) {
-        return nullptr;
-    }
-    const LocalObject first(nameSpaceOf(path.path()), owner, {{cim::findNamed(owner, identifierKey), identifier}});
-    const CMPIInstance* record = session.find(first, owner);
-    const Paths others = record == nullptr ? session.names(owner) : Paths();
-    return others.empty() ? record : session.get(localPath(others.front(), owner), owner);
-}
-
 /** Refuses other read-only values than an existing record has, since all records have the same. */
-void Transaction::requireReadOnlyValues(const Values& given, const std::string& content) const {
-    Values readOnly;
-    std::copy_if(given.begin(), given.end(), std::back_inserter(readOnly),
-                 [](const auto& value) { return !value.first->isWritable; });
-    const CMPIInstance* record = readOnly.empty() ? nullptr : anyRecord(content);
-    if (record != nullptr) {
-        diff(record, readOnly, false);
+void Transaction::requireReadOnlyValues(const Values& given) const {
+    const bool haveReadOnly =
+        std::any_of(given.begin(), given.end(), [](const auto& value) { return !value.first->isWritable; });
+    const Paths records = haveReadOnly ? session.names(owner) : Paths();
+    if (!records.empty()) {
+        diff(session.get(localPath(records.front(), owner), owner), given, false);  // fails if one differs
     }
 }
 

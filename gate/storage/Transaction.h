@@ -38,14 +38,13 @@ public:
 private:
     FileState open(std::size_t growth) const;
     template <class Change>
-    void run(FileState before, Change change) const;
-    std::string rollBack(const FileState& before) const;
+    void run(const FileState& before, Change change) const;
+    std::string rollBack(const std::string& restorable) const;
 
     void apply(const CMPIInstance* current, const Values& changes) const;
     void requireTable() const;
     void storeTable(const CMPIObjectPath* record) const;
-    const CMPIInstance* anyRecord(const std::string& content) const;
-    void requireReadOnlyValues(const Values& given, const std::string& content) const;
+    void requireReadOnlyValues(const Values& given) const;
 
     ProviderSession& session;
     const Class& owner;
