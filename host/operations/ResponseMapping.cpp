@@ -38,7 +38,11 @@ bool isExpected(const ResultEvent& event) {
 /** The result of an event, which it leaves unless it is kept or shared. */
 template <class Kind>
 Kind takeResult(std::shared_ptr<Kind>& result, bool keeps) {
-    return keeps || result.use_count() > 1 ? *result : std::move(*result);
+    if (keeps || result.use_count() > 1) {
+        return *result;
+    }
+    const std::shared_ptr<Kind> taken = std::move(result);  // freed here, while the processor has it in its caches
+    return std::move(*taken);
 }
 
 /** Appends all results of this kind; an error if there are others. They leave the events, unless these are kept. */

@@ -225,6 +225,10 @@ std::variant<CimHeaders, HttpResponse> checkHeaders(const HttpRequest& request, 
         response.headers.emplace("Allow", permittedMethods);
         return response;
     }
+    const auto expected = headerIn(headers, "Expect");
+    if (headers.count("Expect") != 0 && !(expected && cim::sameName(*expected, "100-continue"))) {
+        return refusal(417, "The only supported expectation is 100-continue.");
+    }
     const std::string prefix = extensionPrefixOf(request);
     if (prefix.empty() && request.method == "M-POST") {
         return refusal(510, std::string("M-POST needs the header Man with ") + mapping + ".");

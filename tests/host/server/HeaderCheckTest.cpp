@@ -86,6 +86,14 @@ TEST_F(HeaderCheckTest, OnlyNamesOfTheLoopbackInterfaceAreHostsWithoutAuthentica
     EXPECT_EQ(with("Host", "server.example").result(), "200");
 }
 
+TEST_F(HeaderCheckTest, OnlyTheExpectationToContinueIsSupported) {
+    EXPECT_EQ(with("Expect", "100-Continue").result(), "200");
+    EXPECT_EQ(with("Expect", "200-ok").result(), "417");
+    with("Expect", "100-continue");
+    request.headers.emplace("Expect", "100-continue");
+    EXPECT_EQ(result(), "417");
+}
+
 TEST_F(HeaderCheckTest, HeadersOfTheOperationMustBeThere) {
     EXPECT_EQ(with("CIMOperation", "MethodResponse").result(), "400");
     EXPECT_EQ(with("CIMOperation", "methodcall").result(), "200");
