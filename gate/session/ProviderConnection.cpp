@@ -128,9 +128,9 @@ void ProviderConnection::requireCurrent(LockGuard& guard, bool mayBeOlder) {
     };
     const auto mayUseOlder = [&] { return mayBeOlder && library.isLoaded() && !isOutdated; };
     if (waitWhile(guard, newerTimeout, isWaiting) && !mayUseOlder() && waitWhile(guard, waitTimeout, isWaiting)) {
-        fail(CMPI_RC_ERR_FAILED,
-             upCalls != 0 ? "The provider waits for the object manager and cannot be loaded again. Try again."
-                          : "The record files are incomplete, or another process is writing them. Try again.");
+        failIf(upCalls != 0, CMPI_RC_ERR_FAILED,
+               "The provider waits for the object manager and cannot be loaded again. Try again.");
+        fail(CMPI_RC_ERR_FAILED, "The record files are incomplete, or another process is writing them. Try again.");
     }
 }
 

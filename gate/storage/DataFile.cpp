@@ -71,7 +71,7 @@ durable::RecordFile DataFile::records() const {
 void DataFile::requireWritable(std::size_t growth) const {
     const std::string path = pathOf(*this);
     const std::string directory = KO::PlatformUtilities::getKelsaDataDir();
-    const std::string subject = path + ": the data directory " + directory;
+    const std::string subject = path + ": " + "the data directory " + directory;
     requireWritableFile(path);
     // A rollback and the change of a property file replace the file.
     if (access(directory.c_str(), W_OK | X_OK) != 0) {
