@@ -90,7 +90,7 @@ std::optional<Right> RequestHandler::verified(Exchange& exchange, const std::str
         if (!turn || connection.isEnding()) {
             return std::nullopt;
         }
-        if (!authenticator.accepts(credentials)) {
+        if (!authenticator.accepts(credentials, connection.client().host())) {
             return Right::none;
         }
         connection.authorization = authorization;

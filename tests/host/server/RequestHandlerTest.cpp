@@ -77,6 +77,17 @@ TEST_F(RequestHandlerTest, APasswordIsCheckedOncePerConnection) {
     EXPECT_EQ(authenticator.asked, 5);
 }
 
+TEST_F(RequestHandlerTest, APasswordIsCheckedWithTheAddressOfTheClient) {
+    for (const auto& [client, host] :
+         {std::pair{"192.0.2.7:40312", "192.0.2.7"}, {"[2001:db8::7]:80", "2001:db8::7"}}) {
+        Connection remote{-1, true, {client, ""}};
+        Exchange exchange;
+        exchange.connection = &remote;
+        EXPECT_EQ(status(exchange, head("GetClass", reader), ""), "400");
+        EXPECT_EQ(authenticator.client, host);
+    }
+}
+
 TEST_F(RequestHandlerTest, TheDelayAfterAWrongPasswordIncludesTheTimeOfTheCheck) {
     settings.limits.failureDelay = std::chrono::hours(1);
     Exchange exchange;
