@@ -124,6 +124,14 @@ TEST_F(HeaderCheckTest, OnlyXmlInUtf8IsAccepted) {
     EXPECT_EQ(with("Content-Type", "text/xml").with("Content-Encoding", "gzip").result(), "415");
 }
 
+TEST_F(HeaderCheckTest, TheOnlyExpectationIsToContinue) {
+    EXPECT_EQ(with("Expect", "100-continue").result(), "200");
+    EXPECT_EQ(with("Expect", "100-Continue").result(), "200");
+    for (const char* expectation : {"other", "100-continue, other", "200-ok"}) {
+        EXPECT_EQ(with("Expect", expectation).result(), "417") << expectation;
+    }
+}
+
 TEST_F(HeaderCheckTest, HeadsThatOtherSoftwareReadsDifferentlyAreRefused) {
     const HttpRequest accepted = request;
     for (const auto& [name, value] : {std::pair{"Content-Length ", "100"},
