@@ -151,6 +151,26 @@ TEST_F(RequestHandlerTest, RequestsThatEndBeforeTheirResponseAreLogged) {
                 testing::ContainsRegex(" reader EnumerateInstanceNames - 400/0 0 .*\n.* - - - 400/0 0 0.000\n$"));
 }
 
+TEST_F(RequestHandlerTest, RefusedRequestsAreLoggedWithTheirOperation) {
+    for (const auto& [method, header, operation] : {std::tuple{"POST", "Origin", "GetClass"},
+                                                    {"GET", "Accept", "GetClass"},
+                                                    {"POST", "Expect", "Get%43lass"},
+                                                    {"POST", "CIMMethod", "GetClass"},
+                                                    {"POST", "Expect", "%4"}}) {
+        Exchange exchange;
+        exchange.connection = &connection;
+        HttpRequest request = head(operation);
+        request.method = method;
+        request.headers.emplace(header, "other");
+        const auto refused = handler().begin(exchange, request);
+        ASSERT_TRUE(refused);
+        handler().log(exchange, refused->status);
+    }
+    EXPECT_THAT(testsupport::readFile(directory.path() / "log"),
+                testing::ContainsRegex("- GetClass - 403/0 .*\n.*- GetClass - 405/0 .*\n.*- GetClass - 417/0 .*\n"
+                                       ".*- - - 400/0 .*\n.*- - - 417/0 "));
+}
+
 TEST_F(RequestHandlerTest, BodiesThatAreTooLargeAreIgnoredUpToALimit) {
     EXPECT_EQ(status(head("EnumerateInstanceNames", reader), std::string(2000, ' ')), "400");
     EXPECT_EQ(status(head("EnumerateInstanceNames", reader), std::string(2001, ' ')), "413");
