@@ -81,14 +81,17 @@ public:
     PamTransaction(const PamTransaction&) = delete;
     PamTransaction& operator=(const PamTransaction&) = delete;
 
-    bool accepts() {
+    bool accepts(const std::string& host) {
         if (status != PAM_SUCCESS) {
             return false;
         }
         using Delay = void (*)(int, unsigned, void*);
         Delay delay = &doNotDelay;
         ::pam_set_item(handle, PAM_FAIL_DELAY, reinterpret_cast<const void*>(delay));
-        status = ::pam_authenticate(handle, PAM_SILENT | PAM_DISALLOW_NULL_AUTHTOK);
+        status = ::pam_set_item(handle, PAM_RHOST, host.c_str());
+        if (status == PAM_SUCCESS) {
+            status = ::pam_authenticate(handle, PAM_SILENT | PAM_DISALLOW_NULL_AUTHTOK);
+        }
         if (status == PAM_SUCCESS) {
             status = ::pam_acct_mgmt(handle, PAM_SILENT);
         }
@@ -159,8 +162,8 @@ std::optional<Credentials> credentialsFrom(const std::string& authorization) {
     return Credentials{decoded->substr(0, colon), decoded->substr(colon + 1)};
 }
 
-bool PamAuthenticator::accepts(const Credentials& credentials) {
-    return PamTransaction(service, directory, credentials).accepts();
+bool PamAuthenticator::accepts(const Credentials& credentials, const std::string& host) {
+    return PamTransaction(service, directory, credentials).accepts(host);
 }
 
 Right rightOf(const std::string& user, const AccessRules& rules) {

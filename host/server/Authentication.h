@@ -21,7 +21,9 @@ std::optional<Credentials> credentialsFrom(const std::string& authorization);
 class Authenticator {
 public:
     virtual ~Authenticator() = default;
-    virtual bool accepts(const Credentials& credentials) = 0;
+
+    /** @param host address of the client */
+    virtual bool accepts(const Credentials& credentials, const std::string& host) = 0;
 };
 
 /** Authenticates users of the operating system through a PAM service. */
@@ -31,7 +33,7 @@ public:
     explicit PamAuthenticator(std::string itsService, std::filesystem::path itsDirectory = {})
         : service(std::move(itsService)), directory(std::move(itsDirectory)) {}
 
-    bool accepts(const Credentials& credentials) override;
+    bool accepts(const Credentials& credentials, const std::string& host) override;
 
 private:
     std::string service;

@@ -22,6 +22,11 @@ using Guard = std::lock_guard<std::mutex>;
 
 }  // namespace
 
+std::string ClientAddress::host() const {
+    const std::string host = address.substr(0, address.rfind(':'));
+    return !host.empty() && host.front() == '[' ? host.substr(1, host.size() - 2) : host;
+}
+
 Connection::Connection(int itsSocket, bool isTls, ClientAddress itsClient)
     : descriptor(itsSocket),
       tls(isTls),

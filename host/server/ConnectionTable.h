@@ -20,6 +20,9 @@ namespace cimhost::server {
 struct ClientAddress {
     std::string address{};  ///< with the port, for the access log
     std::string network{};  ///< the part of the address that the limit of connections applies to
+
+    /** The address without its port, and without the brackets of an IPv6 address. */
+    std::string host() const;
 };
 
 /** A client's connection, and the phase of its current request. Phases are entered by the thread of the connection. */

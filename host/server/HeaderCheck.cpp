@@ -102,6 +102,13 @@ std::optional<HttpResponse> checkBody(const Headers& headers, std::size_t larges
     return std::nullopt;
 }
 
+std::optional<HttpResponse> checkExpectation(const Headers& headers) {
+    if (headers.count("Expect") != 0 && !cim::sameName(headerIn(headers, "Expect").value_or(""), "100-continue")) {
+        return refusal(417, "The only expectation that the server meets is 100-continue.");
+    }
+    return std::nullopt;
+}
+
 std::optional<HttpResponse> checkProtocol(const Headers& headers, const std::string& prefix) {
     if (headers.count(prefix + "CIMBatch") != 0) {
         return refusal(501, "Several operations in one message are not supported.", "multiple-requests-unsupported");
@@ -225,13 +232,12 @@ std::variant<CimHeaders, HttpResponse> checkHeaders(const HttpRequest& request, 
         response.headers.emplace("Allow", permittedMethods);
         return response;
     }
-    const auto expected = headerIn(headers, "Expect");
-    if (headers.count("Expect") != 0 && !(expected && cim::sameName(*expected, "100-continue"))) {
-        return refusal(417, "The only supported expectation is 100-continue.");
-    }
     const std::string prefix = extensionPrefixOf(request);
     if (prefix.empty() && request.method == "M-POST") {
         return refusal(510, std::string("M-POST needs the header Man with ") + mapping + ".");
+    }
+    if (auto wrong = checkExpectation(headers)) {
+        return *wrong;
     }
     if (auto wrong = checkProtocol(headers, prefix)) {
         return *wrong;

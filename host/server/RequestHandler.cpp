@@ -36,6 +36,8 @@ RequestHandler::RequestHandler(const Settings& itsSettings, cimxml::Operations& 
 
 std::optional<HttpResponse> RequestHandler::begin(Exchange& exchange, const HttpRequest& request) {
     exchange.extensionPrefix = extensionPrefixOf(request);
+    const auto method = headerIn(request.headers, exchange.extensionPrefix + "CIMMethod");
+    exchange.record.operation = percentDecoded(method.value_or("")).value_or("");
     auto refused = check(exchange, request);
     exchange.isBodyIgnored = refused && mayHaveBody(request.headers);
     exchange.length = lengthIn(request.headers);
@@ -51,7 +53,6 @@ std::optional<HttpResponse> RequestHandler::check(Exchange& exchange, const Http
         return std::move(*response);
     }
     exchange.headers = std::get<CimHeaders>(std::move(checked));
-    exchange.record.operation = exchange.headers.method;
     return exchange.needsAuthentication ? authenticate(exchange, request) : std::nullopt;
 }
 
@@ -90,7 +91,7 @@ std::optional<Right> RequestHandler::verified(Exchange& exchange, const std::str
         if (!turn || connection.isEnding()) {
             return std::nullopt;
         }
-        if (!authenticator.accepts(credentials)) {
+        if (!authenticator.accepts(credentials, connection.client().host())) {
             return Right::none;
         }
         connection.authorization = authorization;

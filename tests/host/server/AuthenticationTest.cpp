@@ -30,13 +30,14 @@ TEST(CredentialsTest, OtherValuesAreRefused) {
     }
 }
 
-/** A PAM service that asks a program, which accepts one user with one password. */
+/** A PAM service that asks a program, which accepts one user with one password from one client. */
 class PamTest : public testing::Test {
 protected:
     PamTest() {
         const std::string program = directory.withSlash() + "check";
         std::ofstream(program) << "#!/bin/sh\nread -r password\n"
-                                  "[ \"$PAM_USER\" = alice ] && [ \"$password\" = \"right one\" ]\n";
+                                  "[ \"$PAM_USER\" = alice ] && [ \"$password\" = \"right one\" ] && "
+                                  "[ \"$PAM_RHOST\" = 192.0.2.7 ]\n";
         std::filesystem::permissions(program, std::filesystem::perms::owner_all);
         std::ofstream(directory.withSlash() + "test-service")
             << "auth required pam_exec.so expose_authtok quiet " << program << "\naccount required pam_permit.so\n";
@@ -45,18 +46,20 @@ protected:
     }
 
     testsupport::TempDirectory directory;
+    const std::string client = "192.0.2.7";
 };
 
 TEST_F(PamTest, TheServiceDecides) {
     PamAuthenticator authenticator("test-service", directory.path());
-    EXPECT_TRUE(authenticator.accepts({"alice", "right one"}));
-    EXPECT_FALSE(authenticator.accepts({"alice", "wrong"}));
-    EXPECT_FALSE(authenticator.accepts({"bob", "right one"}));
-    EXPECT_FALSE(authenticator.accepts({"alice", ""}));
+    EXPECT_TRUE(authenticator.accepts({"alice", "right one"}, client));
+    EXPECT_FALSE(authenticator.accepts({"alice", "wrong"}, client));
+    EXPECT_FALSE(authenticator.accepts({"bob", "right one"}, client));
+    EXPECT_FALSE(authenticator.accepts({"alice", ""}, client));
+    EXPECT_FALSE(authenticator.accepts({"alice", "right one"}, "192.0.2.8"));
 }
 
 TEST_F(PamTest, AccountsMustBeValid) {
-    EXPECT_FALSE(PamAuthenticator("no-account", directory.path()).accepts({"alice", "right one"}));
+    EXPECT_FALSE(PamAuthenticator("no-account", directory.path()).accepts({"alice", "right one"}, client));
 }
 
 TEST(AccessRulesTest, UsersAndGroupsHaveRights) {

@@ -77,6 +77,17 @@ TEST_F(RequestHandlerTest, APasswordIsCheckedOncePerConnection) {
     EXPECT_EQ(authenticator.asked, 5);
 }
 
+TEST_F(RequestHandlerTest, APasswordIsCheckedWithTheAddressOfTheClient) {
+    for (const auto& [client, host] :
+         {std::pair{"192.0.2.7:40312", "192.0.2.7"}, {"[2001:db8::7]:80", "2001:db8::7"}}) {
+        Connection remote{-1, true, {client, ""}};
+        Exchange exchange;
+        exchange.connection = &remote;
+        EXPECT_EQ(status(exchange, head("GetClass", reader), ""), "400");
+        EXPECT_EQ(authenticator.client, host);
+    }
+}
+
 TEST_F(RequestHandlerTest, TheDelayAfterAWrongPasswordIncludesTheTimeOfTheCheck) {
     settings.limits.failureDelay = std::chrono::hours(1);
     Exchange exchange;
@@ -138,6 +149,26 @@ TEST_F(RequestHandlerTest, RequestsThatEndBeforeTheirResponseAreLogged) {
     handler().logIncomplete(connection);
     EXPECT_THAT(testsupport::readFile(directory.path() / "log"),
                 testing::ContainsRegex(" reader EnumerateInstanceNames - 400/0 0 .*\n.* - - - 400/0 0 0.000\n$"));
+}
+
+TEST_F(RequestHandlerTest, RefusedRequestsAreLoggedWithTheirOperation) {
+    for (const auto& [method, header, operation] : {std::tuple{"POST", "Origin", "GetClass"},
+                                                    {"GET", "Accept", "GetClass"},
+                                                    {"POST", "Expect", "Get%43lass"},
+                                                    {"POST", "CIMMethod", "GetClass"},
+                                                    {"POST", "Expect", "%4"}}) {
+        Exchange exchange;
+        exchange.connection = &connection;
+        HttpRequest request = head(operation);
+        request.method = method;
+        request.headers.emplace(header, "other");
+        const auto refused = handler().begin(exchange, request);
+        ASSERT_TRUE(refused);
+        handler().log(exchange, refused->status);
+    }
+    EXPECT_THAT(testsupport::readFile(directory.path() / "log"),
+                testing::ContainsRegex("- GetClass - 403/0 .*\n.*- GetClass - 405/0 .*\n.*- GetClass - 417/0 .*\n"
+                                       ".*- - - 400/0 .*\n.*- - - 417/0 "));
 }
 
 TEST_F(RequestHandlerTest, BodiesThatAreTooLargeAreIgnoredUpToALimit) {

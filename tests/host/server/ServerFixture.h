@@ -14,15 +14,17 @@
 
 namespace cimhost::server::test {
 
-/** Counts how often it is asked, and accepts one password. */
+/** Counts how often it is asked, keeps the client's address, and accepts one password. */
 class FakeAuthenticator : public Authenticator {
 public:
-    bool accepts(const Credentials& credentials) override {
+    bool accepts(const Credentials& credentials, const std::string& host) override {
         ++asked;
+        client = host;
         beforeAnswer();
         return credentials.password == "right";
     }
     std::atomic<int> asked = 0;
+    std::string client{};
     std::function<void()> beforeAnswer = [] {};
 };
 
