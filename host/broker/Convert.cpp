@@ -195,7 +195,8 @@ CMPIData dataFrom(const Value& value, Arena& arena) {
         CMPIData data = nullData(static_cast<CMPIType>(value.type | CMPI_ARRAY));
         if (!value.isNull) {
             data.state = CMPI_goodValue;
-            data.value.array = arena.make<CMPIArray>({value.type, value.items});
+            const ScalarRange elements = value.elements();
+            data.value.array = arena.make<CMPIArray>({value.type, {elements.begin(), elements.end()}});
         }
         return data;
     }

@@ -272,7 +272,7 @@ void ObjectWriter::appendContent(std::string& xml, const Value& value) const {
     if (!value.isArray) {
         return appendScalar(xml, value.single);
     }
-    for (const Scalar& each : value.items) {
+    for (const Scalar& each : value.elements()) {
         if (std::holds_alternative<std::monostate>(each)) {
             const Element null(xml, "VALUE.NULL");
         } else if (referenceIn(each) != nullptr) {

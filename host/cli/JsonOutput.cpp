@@ -13,10 +13,10 @@ using Json = nlohmann::ordered_json;
 Json pathJson(const ObjectPath& path);
 Json instanceJson(const Instance& instance);
 
-template <typename Convert, typename Item>
-Json listJson(const std::vector<Item>& items, Convert convert) {
+template <typename Convert, typename Items>
+Json listJson(const Items& items, Convert convert) {
     Json list = Json::array();
-    for (const Item& item : items) {
+    for (const auto& item : items) {
         list.push_back(convert(item));
     }
     return list;
@@ -47,7 +47,7 @@ Json contentJson(const Value& value) {
         return nullptr;
     }
     const auto scalarJson = [](const Scalar& scalar) { return std::visit(ScalarJson{}, scalar); };
-    return value.isArray ? listJson(value.items, scalarJson) : scalarJson(value.single);
+    return value.isArray ? listJson(value.elements(), scalarJson) : scalarJson(value.single);
 }
 
 Json valueJson(const Value& value) {

@@ -163,10 +163,12 @@ private:
 
 /**
  * Read by jemalloc. With few arenas, the server needs half the memory while it serves several clients, since a request
- * uses what others have freed. Threads still do not wait for each other: each has a cache of free memory.
+ * uses what others have freed. Threads still do not wait for each other: each has a cache of free memory. The other
+ * option lets small objects use what a large result has freed: by default, they get new memory, and the system has to
+ * provide it for each large result again.
  */
 extern "C" [[gnu::visibility("default")]] const char* malloc_conf;
-const char* malloc_conf = "narenas:2";
+const char* malloc_conf = "narenas:2,lg_extent_max_active_fit:24";
 
 int main(int count, char** values) {
     cimhost::ServeCommand serve;

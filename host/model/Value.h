@@ -54,8 +54,8 @@ inline bool isInteger(CMPIType type) {
 
 /** Consecutive scalars of a value, which must outlive the range. */
 struct ScalarRange {
-    const Scalar* first;
-    std::size_t count;
+    const Scalar* first = nullptr;
+    std::size_t count = 0;
 
     const Scalar* begin() const { return first; }
     const Scalar* end() const { return first + count; }
@@ -65,19 +65,41 @@ struct ScalarRange {
     const Scalar& operator[](std::size_t index) const { return first[index]; }
 };
 
-/** A CIM value, also null, with its declared type. Only an array needs memory outside of it. */
+/** The elements of an array, in memory of their own: most values are not arrays, and large results hold many values. */
+class ArrayElements {
+public:
+    ArrayElements() = default;
+    ArrayElements(std::vector<Scalar> initial) : elements(std::make_unique<std::vector<Scalar>>(std::move(initial))) {}
+    ArrayElements(const ArrayElements& other) : elements(other.copy()) {}
+    ArrayElements(ArrayElements&&) noexcept = default;
+    ArrayElements& operator=(ArrayElements other) noexcept {
+        elements = std::move(other.elements);
+        return *this;
+    }
+
+    operator ScalarRange() const {
+        return elements == nullptr ? ScalarRange{} : ScalarRange{elements->data(), elements->size()};
+    }
+
+private:
+    std::unique_ptr<std::vector<Scalar>> copy() const {
+        return elements == nullptr ? nullptr : std::make_unique<std::vector<Scalar>>(*elements);
+    }
+
+    std::unique_ptr<std::vector<Scalar>> elements{};  ///< null: none
+};
+
+/** A CIM value, also null, with its declared type. */
 struct Value {
     CMPIType type = CMPI_null;     ///< element type, without CMPI_ARRAY
     bool isArray = false;          ///< whether it is an array of that type
     bool isNull = true;            ///< whether the value, or the array, is null
     bool lacksCharacters = false;  ///< a string object whose character pointer is null
     Scalar single{};               ///< the value unless an array; std::monostate when null
-    std::vector<Scalar> items{};   ///< the elements of an array; none when null
+    ArrayElements items{};         ///< the elements of an array; none when null
 
     /** The elements of an array, or the single value; none when null. */
-    ScalarRange elements() const {
-        return isArray ? ScalarRange{items.data(), items.size()} : ScalarRange{&single, isNull ? 0U : 1U};
-    }
+    ScalarRange elements() const { return isArray ? items : ScalarRange{&single, isNull ? 0U : 1U}; }
 
     /** A single value of the scalar's own type. */
     static Value of(Scalar scalar);
@@ -122,6 +144,9 @@ public:
     operator const std::string&() const { return string(); }
     operator std::string_view() const { return string(); }
 
+    friend bool operator==(const Name& left, const Name& right) {
+        return left.shared == right.shared || left.string() == right.string();
+    }
     template <class Other>
     friend std::enable_if_t<std::is_convertible_v<const Other&, std::string_view>, bool> operator==(
         const Name& left, const Other& right) {

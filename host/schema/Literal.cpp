@@ -167,11 +167,11 @@ Literal readLiteral(std::string_view source) {
 Value parseValue(std::string_view source, const Property& property, const Schema& schema,
                  const std::string& defaultNameSpace) {
     if (property.isArray) {
-        Value list = Value::array(property.type, {});
+        std::vector<Scalar> elements;
         for (const Literal& literal : readMofArray(source)) {
-            list.items.push_back(typedElement(literal, property, schema, defaultNameSpace));
+            elements.push_back(typedElement(literal, property, schema, defaultNameSpace));
         }
-        return list;
+        return Value::array(property.type, std::move(elements));
     }
     const Literal literal = isPlain(property.type, source) ? plainLiteral(source, property) : readLiteral(source);
     const Scalar element = typedElement(literal, property, schema, defaultNameSpace);

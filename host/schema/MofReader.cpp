@@ -276,11 +276,11 @@ private:
         if (!type.isArray) {
             fail(initializer, type.name + " is not an array: expected one value without braces");
         }
-        Value value = Value::array(type.type, {});
+        std::vector<Scalar> elements;
         for (const Node* constant : children<mof::Constant>(initializer)) {
-            value.items.push_back(readElement(*constant, type));
+            elements.push_back(readElement(*constant, type));
         }
-        return value;
+        return Value::array(type.type, std::move(elements));
     }
 
     Scalar readElement(const Node& constant, const Property& type) const {

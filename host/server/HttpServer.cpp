@@ -4,7 +4,6 @@
 #include <unistd.h>
 
 #include <atomic>
-#include <cstring>
 
 #include "server/Sockets.h"
 
@@ -18,27 +17,21 @@ using Response = std::unique_ptr<MHD_Response, decltype(&MHD_destroy_response)>;
 /** The text of a response that is sent in blocks. */
 struct Stream {
     std::shared_ptr<cimxml::ResponseText> source;
-    std::string block;     ///< the next part
-    std::size_t sent = 0;  ///< bytes of the block
+    std::string text;  ///< that is not sent yet
 };
 
 ssize_t readStream(void* context, std::uint64_t, char* buffer, std::size_t size) {
     auto& stream = *static_cast<Stream*>(context);
     try {
-        if (stream.sent == stream.block.size()) {
-            stream.block.clear();
-            stream.sent = 0;
-            stream.source->append(stream.block, size);
-        }
+        stream.source->append(stream.text, size);
     } catch (const std::exception&) {
         return MHD_CONTENT_READER_END_WITH_ERROR;
     }
-    if (stream.block.empty()) {
+    if (stream.text.empty()) {
         return MHD_CONTENT_READER_END_OF_STREAM;
     }
-    const std::size_t count = std::min(size, stream.block.size() - stream.sent);
-    std::memcpy(buffer, stream.block.data() + stream.sent, count);
-    stream.sent += count;
+    const std::size_t count = stream.text.copy(buffer, size);
+    stream.text.erase(0, count);
     return static_cast<ssize_t>(count);
 }
 
@@ -55,7 +48,7 @@ Response textResponse(CimReply reply, Connection& connection) {
     if (reply.isComplete && !connection.usesChunks) {
         return bufferResponse(reply.beginning);
     }
-    auto stream = std::make_unique<Stream>(Stream{std::move(reply.text), std::move(reply.beginning), 0});
+    auto stream = std::make_unique<Stream>(Stream{std::move(reply.text), std::move(reply.beginning)});
     connection.usesChunks = true;
     return {MHD_create_response_from_callback(MHD_SIZE_UNKNOWN, blockSize, &readStream, stream.release(),
                                               [](void* context) { delete static_cast<Stream*>(context); }),

@@ -39,8 +39,13 @@ void trim(Scalar& scalar, const std::function<bool(char)>& isRemoved) {
 void trim(std::vector<NamedValue>& values, const std::function<bool(char)>& isRemoved) {
     for (NamedValue& each : values) {
         trim(each.value.single, isRemoved);
-        for (Scalar& item : each.value.items) {
-            trim(item, isRemoved);
+        if (each.value.isArray) {
+            const ScalarRange sent = each.value.elements();
+            std::vector<Scalar> elements(sent.begin(), sent.end());
+            for (Scalar& element : elements) {
+                trim(element, isRemoved);
+            }
+            each.value.items = std::move(elements);
         }
     }
 }
