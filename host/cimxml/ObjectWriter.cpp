@@ -152,6 +152,21 @@ void requireRepresentable(const Value& value, const std::string& className, cons
     }
 }
 
+/** The start tag with the class of the last object, which the next one usually has too. */
+struct ClassTag {
+    std::string className{};
+    std::string start{};
+
+    void append(std::string& xml, std::string_view element, const std::string& itsClassName) {
+        if (start.empty() || className != itsClassName) {
+            className = itsClassName;
+            start.clear();
+            appendStartTag(start, element, [&] { appendAttribute(start, "CLASSNAME", className); });
+        }
+        xml += start;
+    }
+};
+
 }  // namespace
 
 struct ObjectWriter::Tags {
@@ -224,7 +239,8 @@ void ObjectWriter::append(std::string& xml, const ObjectPath& path, ObjectForm f
 
 void ObjectWriter::appendInstance(std::string& xml, const Instance& instance, const InstanceParts& parts) const {
     thread_local std::vector<Tags> ofProperties;
-    const Element element(xml, "INSTANCE", [&] { appendAttribute(xml, "CLASSNAME", instance.path.className); });
+    thread_local ClassTag tag;
+    tag.append(xml, "INSTANCE", instance.path.className);
     const Class* known = parts.origins != nullptr ? parts.origins->findClass(instance.path.className) : nullptr;
     std::size_t position = 0;
     for (const NamedValue& property : instance.properties) {
@@ -234,6 +250,7 @@ void ObjectWriter::appendInstance(std::string& xml, const Instance& instance, co
             appendProperty(xml, property, origin, Tags::at(position++, ofProperties));
         }
     }
+    xml += "</INSTANCE>";
 }
 
 void ObjectWriter::appendProperty(std::string& xml, const NamedValue& property, std::string_view origin,
@@ -308,11 +325,13 @@ void ObjectWriter::appendReference(std::string& xml, const ObjectPath& path) con
 
 void ObjectWriter::appendInstanceName(std::string& xml, const ObjectPath& path) const {
     thread_local std::vector<Tags> ofKeys;
-    const Element name(xml, "INSTANCENAME", [&] { appendAttribute(xml, "CLASSNAME", path.className); });
+    thread_local ClassTag tag;
+    tag.append(xml, "INSTANCENAME", path.className);
     std::size_t position = 0;
     for (const NamedValue& key : path.keys) {
         appendKey(xml, key, Tags::at(position++, ofKeys));
     }
+    xml += "</INSTANCENAME>";
 }
 
 void ObjectWriter::appendKey(std::string& xml, const NamedValue& key, Tags& tags) const {

@@ -35,14 +35,15 @@ bool isExpected(const ResultEvent& event) {
            resultOf<ErrorInfo>(event) != nullptr || std::holds_alternative<NullResult>(event);
 }
 
-/** The result of an event, which it leaves unless it is kept or shared. */
+/** Appends the result of an event, which it leaves unless it is kept or shared. */
 template <class Kind>
-Kind takeResult(std::shared_ptr<Kind>& result, bool keeps) {
+void appendResult(std::vector<Kind>& results, std::shared_ptr<Kind>& result, bool keeps) {
     if (keeps || result.use_count() > 1) {
-        return *result;
+        results.push_back(*result);
+    } else {
+        results.push_back(std::move(*result));
+        result.reset();  // while the processor has it in its caches
     }
-    const std::shared_ptr<Kind> taken = std::move(result);  // freed here, while the processor has it in its caches
-    return std::move(*taken);
 }
 
 /** Appends all results of this kind; an error if there are others. They leave the events, unless these are kept. */
@@ -58,7 +59,7 @@ Status collect(std::vector<ProviderResponse>& responses, Operation operation, bo
         results.reserve(results.size() + response.events.size());
         for (ResultEvent& event : response.events) {
             if (auto* one = std::get_if<typename AlternativeFor<Kind>::Type>(&event)) {
-                results.push_back(takeResult(*one, keepsEvents));
+                appendResult(results, *one, keepsEvents);
             }
         }
     }
