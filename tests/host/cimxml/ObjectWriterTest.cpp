@@ -1,6 +1,8 @@
 #include <gtest/gtest.h>
 
+#include <future>
 #include <memory>
+#include <string>
 
 #include "CimXmlFixture.h"
 #include "cimxml/ObjectWriter.h"
@@ -10,6 +12,17 @@
 namespace cimhost::cimxml::test {
 namespace {
 
+std::string written(const Instance& instance) {
+    std::string xml;
+    ObjectWriter("host", "root/test").append(xml, instance, ObjectForm::instanceWithPath);
+    return xml;
+}
+
+/** The XML of the first object that a thread writes. */
+std::string writtenAlone(const Instance& instance) {
+    return std::async(std::launch::async, written, instance).get();
+}
+
 TEST(ObjectWriterTest, AnObjectDoesNotDependOnThoseWrittenBefore) {
     const auto path = std::make_shared<const ObjectPath>(pathOf("Other", "a"));
     const auto embedded = std::make_shared<const Instance>(
@@ -18,16 +31,12 @@ TEST(ObjectWriterTest, AnObjectDoesNotDependOnThoseWrittenBefore) {
                             Value::of("string"), Value::array(CMPI_string, {"a"}), Value::null(CMPI_string, true),
                             Value::of(path),     Value::array(CMPI_ref, {path}),   Value::null(CMPI_ref),
                             Value::of(embedded), Value::null(CMPI_string),         Value::of("string")};
-    const ObjectWriter writer("host", "root/test");
     for (const Value& value : values) {
         for (const char* name : {"P", "Q", "P"}) {
-            Instance instance{pathOf("Base", "k"), {{"First", Value::of("f")}, {name, value}, {"Last", Value::of(2U)}}};
+            Instance instance{pathOf(value.isNull ? "Base" : "Other", "k"),
+                              {{"First", Value::of("f")}, {name, value}, {"Last", Value::of(2U)}}};
             instance.path.keys.push_back({name, value.isNull || value.isArray ? Value::of("k") : value});
-            std::string xml;
-            std::string alone;
-            writer.append(xml, instance, ObjectForm::instanceWithPath);
-            ObjectWriter("host", "root/test").append(alone, instance, ObjectForm::instanceWithPath);
-            EXPECT_EQ(xml, alone);
+            EXPECT_EQ(written(instance), writtenAlone(instance));
         }
     }
 }
