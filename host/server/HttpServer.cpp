@@ -149,6 +149,9 @@ struct HttpServer::Endpoint {
         // Bytes that still arrive belong to the body of this request, not to the head of another.
         const bool isLast = exchange->isBodyIgnored || code != MHD_REQUEST_TERMINATED_COMPLETED_OK;
         connection.enter(isLast ? Connection::Phase::refusal : Connection::Phase::idle);
+        if (!isLast) {
+            awaitInputBriefly(connection.socket());
+        }
     }
 
     static MHD_Result handle(void* self, MHD_Connection* connection, const char*, const char* method, const char*,

@@ -13,6 +13,7 @@
 #include <chrono>
 #include <cstring>
 #include <memory>
+#include <thread>
 
 namespace cimhost::server {
 namespace {
@@ -126,6 +127,14 @@ void discardInput(int socket, std::size_t most) {
             return;
         }
         received += static_cast<std::size_t>(count);
+    }
+}
+
+void awaitInputBriefly(int socket) {
+    constexpr int most = 50;
+    pollfd readable{socket, POLLIN, 0};
+    for (int attempts = 0; attempts < most && ::poll(&readable, 1, 0) == 0; ++attempts) {
+        std::this_thread::yield();
     }
 }
 

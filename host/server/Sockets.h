@@ -46,4 +46,10 @@ std::uint64_t bytesAcknowledged(int socket);
  */
 void discardInput(int socket, std::size_t most);
 
+/**
+ * Waits for input without sleeping, for the time in which a client usually sends its next request. It is about as long
+ * as it takes to put a thread to sleep and wake it.
+ */
+void awaitInputBriefly(int socket);
+
 }  // namespace cimhost::server
