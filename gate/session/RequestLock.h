@@ -9,6 +9,7 @@
 #include <cstddef>
 #include <functional>
 #include <mutex>
+#include <optional>
 
 #include "gate/cmpi/Failure.h"
 
@@ -72,13 +73,11 @@ public:
 
 private:
     enum class State { open, closing, closed };
-    enum class IfClosed { fail, wait };
     struct Waiter;
 
-    bool waitForLock(std::unique_lock<std::mutex>& lock, IfClosed ifClosed);
-    void refuseWaiters();
-    void admitNext();
-    void notifyClosers();
+    bool waitForLock(std::unique_lock<std::mutex>& lock, std::optional<std::size_t> itsGeneration);
+    void notify();
+    static void notifyAll(Waiter* list);
     static Waiter*& linkTo(const Waiter* waiter, Waiter*& list);
     std::size_t count(Waiter* const& first) const noexcept;
 
