@@ -68,8 +68,7 @@ bool hasNext(CMPIEnumeration* computers) {
 /** A copy of the instance's path with the request's namespace, which some managers omit. */
 const CMPIObjectPath* computerPathOf(const ClientRequest& request, const CMPIInstance* instance) {
     const CMPIObjectPath* given = pathOf(instance);
-    const Property& name = *cim::findNamed(*findClass(computerClass), "Name");
-    require(keyOf(given, name).has_value(), "name a computer");
+    require(keyOf(given, "Name", CMPI_string).has_value(), "name a computer");
     CMPIObjectPath* path = makePath(request.broker(), nameSpaceOf(request.path), classNameOf(given).c_str());
     const CMPICount count = keyCountOf(given);
     for (CMPICount index = 0; index < count; ++index) {

@@ -56,12 +56,7 @@ bool RequestLock::acquire() noexcept {
     return state == State::open && waitForLock(lock, generation());
 }
 
-void RequestLock::reacquire() noexcept {
-    std::unique_lock<std::mutex> lock(mutex);
-    waitForLock(lock, std::nullopt);
-}
-
-bool RequestLock::reacquire(std::size_t itsGeneration) noexcept {
+bool RequestLock::reacquire(std::optional<std::size_t> itsGeneration) noexcept {
     std::unique_lock<std::mutex> lock(mutex);
     return waitForLock(lock, itsGeneration);
 }

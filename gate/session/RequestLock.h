@@ -41,10 +41,11 @@ public:
     bool acquire() noexcept;
     /** Passes the lock to the longest waiter. */
     void release() noexcept;
-    /** Acquires the lock after an intermediate release(). If the lock is closed, waits until it is opened. */
-    void reacquire() noexcept;
-    /** The same, but returns false without the lock if it has been closed since that generation. */
-    bool reacquire(std::size_t itsGeneration) noexcept;
+    /**
+     * Acquires the lock after an intermediate release(). If the lock is closed, waits until it is opened; with a
+     * generation, returns false without the lock if it has been closed since then.
+     */
+    bool reacquire(std::optional<std::size_t> itsGeneration = std::nullopt) noexcept;
 
     /** Number of shutdowns. A request of an earlier generation has lost its object manager. */
     std::size_t generation() const noexcept { return timesClosed; }
