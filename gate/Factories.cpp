@@ -80,11 +80,6 @@ CMPIStatus cleanUp(Interface*, const CMPIContext* context, CMPIBoolean isTermina
     return guarded([] { return theConnection.broker(); }, [&] { theConnection.shutdown(context); });
 }
 
-CMPIStatus execQuery(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*, const char*,
-                     const char*) {
-    return statusOf(CMPI_RC_ERR_NOT_SUPPORTED, supportsNoQueries);
-}
-
 CMPIInstanceMIFT instanceFunctions{
     CMPIVersion200,
     CMPIVersion200,
@@ -96,7 +91,9 @@ CMPIInstanceMIFT instanceFunctions{
     runOperation<createInstance>,
     runOperation<modifyInstance>,
     runOperation<deleteInstance>,
-    execQuery,
+    [](CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*, const char*, const char*) {
+        return statusOf(CMPI_RC_ERR_NOT_SUPPORTED, supportsNoQueries);
+    },
 };
 
 CMPIAssociationMIFT associationFunctions{

@@ -139,6 +139,7 @@ public:
      */
     template <class Work>
     void releaseFor(Work work) {
+        const std::size_t generation = theRequestLock.generation();  // cannot change while the lock is held
         theRequestLock.release();
         isHeld = false;
         work();
@@ -149,7 +150,6 @@ public:
 private:
     CancellationDisabled cancellationDisabled;
     bool isHeld;
-    const std::size_t generation = theRequestLock.generation();  ///< cannot change while the lock is held
 };
 
 }  // namespace gate
