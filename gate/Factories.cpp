@@ -27,13 +27,12 @@ CMPIStatus statusOf(const CMPIBroker* broker, CMPIrc rc, const char* text, const
     if (broker == nullptr) {
         return statusOf(rc, shuttingDown);
     }
-    CMPIString* message = nullptr;
     try {
-        message = make<&CMPIBrokerEncFT::newString>(broker, (std::string(text) + detail).c_str());
+        CMPIString* message = make<&CMPIBrokerEncFT::newString>(broker, (std::string(text) + detail).c_str());
+        return message != nullptr ? CMPIStatus{rc, message} : statusOf(rc, lacksMessage);
     } catch (...) {
-        message = nullptr;
+        return statusOf(rc, lacksMessage);
     }
-    return message != nullptr ? CMPIStatus{rc, message} : statusOf(rc, lacksMessage);
 }
 
 /**
@@ -59,31 +58,18 @@ CMPIStatus guarded(Broker broker, Work work) {
 }
 
 /** The function of an interface that runs an operation. */
-template <class Interface, auto operation>
-struct Entry;
-
-template <class Interface, class... Arguments, void (*operation)(const ClientRequest&, Arguments...)>
-struct Entry<Interface, operation> {
-    static CMPIStatus call(Interface*, const CMPIContext* context, const CMPIResult* result, const CMPIObjectPath* path,
-                           Arguments... arguments) {
-        const ActiveRequest active;
-        if (!active.isAdmitted) {
-            return statusOf(CMPI_RC_ERR_FAILED, shuttingDown);
-        }
-        const ClientRequest request{context, result, path};
-        return guarded([&] { return request.brokerOrNull(); },
-                       [&] {
-                           request.broker();  // there must be one
-                           operation(request, arguments...);
-                       });
-    }
-};
-
-template <auto operation>
-constexpr auto onInstance = &Entry<CMPIInstanceMI, operation>::call;
-
-template <auto operation>
-constexpr auto onAssociation = &Entry<CMPIAssociationMI, operation>::call;
+template <auto operation, class Interface, class... Arguments>
+CMPIStatus runOperation(Interface*, const CMPIContext* context, const CMPIResult* result, const CMPIObjectPath* path,
+                        Arguments... arguments) {
+    const ActiveRequest active;
+    const ClientRequest request{context, result, path};
+    return guarded([&] { return request.brokerOrNull(); },
+                   [&] {
+                       ManagerGone::throwUnless(active.isAdmitted);
+                       request.broker();  // there must be one
+                       operation(request, arguments...);
+                   });
+}
 
 /** Refuses to be unloaded while idle: the provider's tables hold values that its files lose. */
 template <class Interface>
@@ -94,34 +80,31 @@ CMPIStatus cleanUp(Interface*, const CMPIContext* context, CMPIBoolean isTermina
     return guarded([] { return theConnection.broker(); }, [&] { theConnection.shutdown(context); });
 }
 
-CMPIStatus execQuery(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*, const char*,
-                     const char*) {
-    return statusOf(CMPI_RC_ERR_NOT_SUPPORTED, supportsNoQueries);
-}
-
 CMPIInstanceMIFT instanceFunctions{
     CMPIVersion200,
     CMPIVersion200,
     "instanceLeaseAndWarrantyGate",
-    cleanUp<CMPIInstanceMI>,
-    onInstance<enumerateInstanceNames>,
-    onInstance<enumerateInstances>,
-    onInstance<getInstance>,
-    onInstance<createInstance>,
-    onInstance<modifyInstance>,
-    onInstance<deleteInstance>,
-    execQuery,
+    cleanUp,
+    runOperation<enumerateInstanceNames>,
+    runOperation<enumerateInstances>,
+    runOperation<getInstance>,
+    runOperation<createInstance>,
+    runOperation<modifyInstance>,
+    runOperation<deleteInstance>,
+    [](CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*, const char*, const char*) {
+        return statusOf(CMPI_RC_ERR_NOT_SUPPORTED, supportsNoQueries);
+    },
 };
 
 CMPIAssociationMIFT associationFunctions{
     CMPIVersion200,
     CMPIVersion200,
     "associationLeaseAndWarrantyGate",
-    cleanUp<CMPIAssociationMI>,
-    onAssociation<associators>,
-    onAssociation<associatorNames>,
-    onAssociation<references>,
-    onAssociation<referenceNames>,
+    cleanUp,
+    runOperation<associators>,
+    runOperation<associatorNames>,
+    runOperation<references>,
+    runOperation<referenceNames>,
 };
 
 CMPIInstanceMI instanceInterface{nullptr, &instanceFunctions};
@@ -130,10 +113,9 @@ CMPIAssociationMI associationInterface{nullptr, &associationFunctions};
 /** Returns an interface once the provider is connected; otherwise null, with the reason in the status. */
 template <class Interface>
 Interface* open(const CMPIBroker* broker, CMPIStatus* rc, Interface& interface) {
-    CMPIStatus status = statusOf(CMPI_RC_ERR_INVALID_PARAMETER, lacksBroker);
-    if (broker != nullptr) {
-        status = guarded([&] { return broker; }, [&] { theConnection.connect(broker); });
-    }
+    const CMPIStatus status = broker == nullptr
+                                  ? statusOf(CMPI_RC_ERR_INVALID_PARAMETER, lacksBroker)
+                                  : guarded([&] { return broker; }, [&] { theConnection.connect(broker); });
     if (rc != nullptr) {
         *rc = status;
     }

@@ -87,20 +87,6 @@ std::optional<CMPIUint32> numberIn(const std::string& digits, CMPIType type) {
     return error == std::errc() && number <= limit ? std::optional<CMPIUint32>(number) : std::nullopt;
 }
 
-/** An integer or boolean as a CMPI value. */
-CMPIValue scalarFrom(const std::string& characters, CMPIType type) {
-    CMPIValue value{};
-    const CMPIUint32 number = numberIn(characters, type).value_or(0);
-    if (type == CMPI_boolean) {
-        value.boolean = characters == "true" ? 1 : 0;
-    } else if (type == CMPI_uint16) {
-        value.uint16 = static_cast<CMPIUint16>(number);
-    } else {
-        value.uint32 = number;
-    }
-    return value;
-}
-
 /** Whether the second path has that key of the first one. */
 bool sameKey(const CMPIData& key, const char* name, const CMPIObjectPath* other) {
     const auto found = ask<&CMPIObjectPathFT::getKey>(other, name);
@@ -111,8 +97,7 @@ bool sameKey(const CMPIData& key, const char* name, const CMPIObjectPath* other)
     }
     const CMPIType type = key.type == CMPI_chars ? CMPI_string : key.type;
     const auto value = cim::hasValue(key) ? cim::charactersOf(key) : std::nullopt;
-    const bool isUsable = found.isOk() && cim::hasValue(found.value) && isConvertible(found.value, type);
-    return value && isUsable && value == cim::charactersOf(found.value);
+    return value && value == keyOf(other, name, type);
 }
 
 }  // namespace
@@ -136,9 +121,9 @@ std::optional<std::string> propertyOf(const CMPIInstance* instance, const Proper
     return characters;
 }
 
-std::optional<std::string> keyOf(const CMPIObjectPath* path, const Property& property) {
-    const auto answer = ask<&CMPIObjectPathFT::getKey>(path, property.name);
-    const bool isUsable = answer.isOk() && cim::hasValue(answer.value) && isConvertible(answer.value, property.type);
+std::optional<std::string> keyOf(const CMPIObjectPath* path, const char* key, CMPIType type) {
+    const auto answer = ask<&CMPIObjectPathFT::getKey>(path, key);
+    const bool isUsable = answer.isOk() && cim::hasValue(answer.value) && isConvertible(answer.value, type);
     return isUsable ? cim::charactersOf(answer.value) : std::nullopt;
 }
 
@@ -181,9 +166,13 @@ CMPIData LocalObject::dataOf(Member* member, CMPIValueState state, CMPIrc notFou
     if (member == nullptr) {
         return {CMPI_null, CMPI_notFound | CMPI_nullValue, {}};
     }
-    CMPIValue value = scalarFrom(member->characters, member->type);
+    CMPIValue value{};
     if (member->type == CMPI_string) {
         value.string = member->valueString.handle();
+    } else if (member->type == CMPI_boolean) {
+        value.boolean = member->characters == "true" ? 1 : 0;
+    } else {  // no class has other writable integers
+        value.uint32 = numberIn(member->characters, CMPI_uint32).value_or(0);
     }
     return {member->type, state, value};
 }
@@ -230,7 +219,7 @@ LocalObject localPath(const CMPIObjectPath* path, const Class& named) {
     Values keys;
     for (const Property& property : named) {
         if (property.isKey) {
-            const auto value = keyOf(path, property);
+            const auto value = keyOf(path, property.name, property.type);
             failIf(!value, CMPI_RC_ERR_INVALID_PARAMETER, "The path of a ", named.name, " needs the key ",
                    property.name, " as a string.");
             keys.emplace_back(&property, *value);

@@ -49,7 +49,7 @@ auto demand(const char* task, Object* object, Arguments... arguments) {
     return answer.value;
 }
 
-/** @name Parts and creation of objects, which fail if the object manager does */
+/** @name Parts, creation and extension of objects, which fail if the object manager does */
 ///@{
 std::string classNameOf(const CMPIObjectPath* path);
 std::string nameSpaceOf(const CMPIObjectPath* path);
@@ -61,6 +61,14 @@ CMPIObjectPath* makePath(const CMPIBroker* broker, const std::string& nameSpace,
 
 /** An instance without properties. */
 CMPIInstance* makeInstance(const CMPIBroker* broker, const CMPIObjectPath* path);
+
+inline void addKey(CMPIObjectPath* path, const char* name, const CMPIValue* value, CMPIType type) {
+    requireOk("add a key", tell<&CMPIObjectPathFT::addKey>(path, name, value, type));
+}
+
+inline void setProperty(const CMPIInstance* instance, const char* name, const CMPIValue* value, CMPIType type) {
+    requireOk("set a property", tell<&CMPIInstanceFT::setProperty>(instance, name, value, type));
+}
 ///@}
 
 // The gate compares and checks values as C++ strings, whatever their CIM type: the characters of a string or datetime,
@@ -88,20 +96,10 @@ Values valuesOf(const CMPIInstance* instance, const Class& owner, IsWanted isWan
 }
 
 /** Reads a key that is not a reference. None also if it has another type or the object manager cannot read it. */
-std::optional<std::string> keyOf(const CMPIObjectPath* path, const Property& property);
+std::optional<std::string> keyOf(const CMPIObjectPath* path, const char* key, CMPIType type);
 
 /** The object that a key refers to; null if there is none. */
 CMPIObjectPath* referenceOf(const CMPIObjectPath* path, const char* key);
-
-/** Sets a property of an instance. Fails if the object manager does. */
-inline void setProperty(const CMPIInstance* instance, const char* name, const CMPIValue* value, CMPIType type) {
-    requireOk("set a property", tell<&CMPIInstanceFT::setProperty>(instance, name, value, type));
-}
-
-/** Adds a key to a path. Fails if the object manager does. */
-inline void addKey(CMPIObjectPath* path, const char* name, const CMPIValue* value, CMPIType type) {
-    requireOk("add a key", tell<&CMPIObjectPathFT::addKey>(path, name, value, type));
-}
 
 /** Whether two paths have keys and name the same instance. Namespaces are compared where both paths have one. */
 bool samePath(const CMPIObjectPath* left, const CMPIObjectPath* right);

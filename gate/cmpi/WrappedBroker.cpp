@@ -19,32 +19,26 @@ private:
     const WrappedBroker::Lock lock;
 };
 
-/** The function that replaces the one of a slot. */
-template <auto slot>
-struct Forward;
-
-template <class Table, class Result, class... Arguments, Result (*Table::*slot)(const CMPIBroker*, Arguments...)>
-struct Forward<slot> {
-    static constexpr bool makesAnswers =
-        std::is_same_v<Result, CMPIInstance*> || std::is_same_v<Result, CMPIObjectPath*>;
-
-    static Result call(const CMPIBroker* broker, Arguments... arguments) {
-        auto& wrapper = *static_cast<WrappedBroker*>(broker->hdl);
-        const CMPIBroker* manager = wrapper.manager;
-        const auto function = std::get<Table*>(std::tuple(manager->bft, manager->eft, manager->mft))->*slot;
-        if constexpr (std::is_same_v<Table, CMPIBrokerFT>) {
-            const ScopedRelease scopedRelease(wrapper.lock);
-            return function(manager, arguments...);
-        } else if constexpr (makesAnswers) {
-            const Result made = function(manager, arguments...);
-            const CMPIStatus* status = std::get<sizeof...(Arguments) - 1>(std::tie(arguments...));
-            wrapper.hasFailed = wrapper.hasFailed || made == nullptr || (status != nullptr && status->rc != CMPI_RC_OK);
-            return made;
-        } else {
-            return function(manager, arguments...);
-        }
+/** Calls the manager's function of a slot. */
+template <auto slot, class Table, class Result, class... Arguments>
+Result forward(const CMPIBroker* broker, Arguments... arguments) {
+    constexpr bool isService = std::is_same_v<Table, CMPIBrokerFT>;
+    constexpr bool makesAnswers = std::is_same_v<Result, CMPIInstance*> || std::is_same_v<Result, CMPIObjectPath*>;
+    auto& wrapper = *static_cast<WrappedBroker*>(broker->hdl);
+    const CMPIBroker* manager = wrapper.manager;
+    const auto function = std::get<Table*>(std::tuple(manager->bft, manager->eft, manager->mft))->*slot;
+    if constexpr (isService) {
+        const ScopedRelease scopedRelease(wrapper.lock);
+        return function(manager, arguments...);
+    } else if constexpr (makesAnswers) {
+        const Result made = function(manager, arguments...);
+        const CMPIStatus* status = std::get<sizeof...(Arguments) - 1>(std::tie(arguments...));
+        wrapper.hasFailed = wrapper.hasFailed || made == nullptr || (status != nullptr && status->rc != CMPI_RC_OK);
+        return made;
+    } else {
+        return function(manager, arguments...);
     }
-};
+}
 
 /** A copy of a manager's table in which these slots are replaced, unless they are null. */
 template <auto... slots, class Table>
@@ -53,7 +47,7 @@ Table wrapped(const Table* original) {
         return Table{};
     }
     Table table = *original;
-    ((table.*slots = original->*slots == nullptr ? nullptr : &Forward<slots>::call), ...);
+    ((table.*slots == nullptr ? nullptr : (table.*slots = forward<slots, Table>)), ...);
     return table;
 }
 

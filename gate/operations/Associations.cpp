@@ -15,14 +15,15 @@ struct End {
     const CMPIInstance* instance;
 };
 
-/** The computers that the object manager knows. */
-using Computers = std::vector<End>;
+enum class ElementForm { path, instance };
 
-/** A direction of an association. Without source and target, all pairs. */
+/** A direction of an association, and the ends that its pairs must have: null for any. */
 struct Traversal {
     const Class* association;
-    const Property* source = nullptr;
-    const Property* target = nullptr;
+    ElementForm form = ElementForm::path;  ///< of the elements, unless one is required
+    const Property* target = nullptr;      ///< the property that refers to the associated object
+    const CMPIObjectPath* computer = nullptr;
+    const CMPIObjectPath* element = nullptr;
 };
 
 /** A computer and one of its leases or warranties, which is either a path or an instance. */
@@ -32,8 +33,7 @@ struct AssociationPair {
     End element;
 };
 
-enum class ElementForm { path, instance };
-
+using Ends = std::vector<End>;
 using Traversals = std::vector<Traversal>;
 using Pairs = std::vector<AssociationPair>;
 
@@ -66,12 +66,10 @@ bool hasNext(CMPIEnumeration* computers) {
 }
 
 /** A copy of the instance's path with the request's namespace, which some managers omit. */
-const CMPIObjectPath* computerPathOf(const ClientRequest& request, const CMPIBroker* broker,
-                                     const CMPIInstance* instance) {
+const CMPIObjectPath* computerPathOf(const ClientRequest& request, const CMPIInstance* instance) {
     const CMPIObjectPath* given = pathOf(instance);
-    const Property& name = *cim::findNamed(*findClass(computerClass), "Name");
-    require(keyOf(given, name).has_value(), "name a computer");
-    CMPIObjectPath* path = makePath(broker, nameSpaceOf(request.path), classNameOf(given).c_str());
+    require(keyOf(given, "Name", CMPI_string).has_value(), "name a computer");
+    CMPIObjectPath* path = makePath(request.broker(), nameSpaceOf(request.path), classNameOf(given).c_str());
     const CMPICount count = keyCountOf(given);
     for (CMPICount index = 0; index < count; ++index) {
         CMPIString* keyName = nullptr;
@@ -83,14 +81,14 @@ const CMPIObjectPath* computerPathOf(const ClientRequest& request, const CMPIBro
 }
 
 /** Enumerates the computers in the request's namespace, each once. Releases the lock for it. */
-Computers knownComputers(const ClientRequest& request, ProviderSession& session) {
-    Computers computers;
+Ends knownComputers(const ClientRequest& request, ProviderSession& session) {
+    Ends computers;
     CMPIEnumeration* enumeration = enumerateComputers(request, session);
     while (hasNext(enumeration)) {
         const auto next = ask<&CMPIEnumerationFT::getNext>(enumeration);
         CMPIInstance* instance = next.isOk() ? cim::elementInstance(next.value) : nullptr;
         requireEnumerated(instance != nullptr, next.status);
-        const CMPIObjectPath* path = computerPathOf(request, request.broker(), instance);
+        const CMPIObjectPath* path = computerPathOf(request, instance);
         if (nameSpaceOf(pathOf(instance)).empty()) {
             // Makes the instance's path complete, too, if the manager can.
             tell<&CMPIInstanceFT::setObjectPath>(instance, path);
@@ -104,27 +102,32 @@ Computers knownComputers(const ClientRequest& request, ProviderSession& session)
     return computers;
 }
 
-/** The computer with the path, or none. */
-Computers computerAt(const CMPIObjectPath* path, Computers computers) {
-    const auto isOther = [&](const End& each) { return !samePath(each.path, path); };
-    computers.erase(std::remove_if(computers.begin(), computers.end(), isOther), computers.end());
-    return computers;
+/** Adds the pairs of a computer. The provider knows its leases and warranties. */
+void addPairs(Pairs& pairs, const ProviderSession& session, const Traversal& traversal, const End& computer) {
+    if (traversal.computer != nullptr && !samePath(computer.path, traversal.computer)) {
+        return;
+    }
+    const LocalObject keys = localPath(computer.path, *findClass(computerClass));
+    if (traversal.form == ElementForm::instance && traversal.element == nullptr) {
+        for (const CMPIInstance* instance : session.associators(keys, *traversal.association)) {
+            pairs.push_back({traversal, computer, {nullptr, instance}});
+        }
+        return;
+    }
+    for (const CMPIObjectPath* path : session.associatorNames(keys, *traversal.association)) {
+        if (traversal.element == nullptr || samePath(path, traversal.element)) {
+            pairs.push_back({traversal, computer, {path, nullptr}});
+        }
+    }
 }
 
-/** The pairs of an association, in the order of the computers. The provider knows the elements of each. */
-Pairs pairsOf(const ProviderSession& session, const Computers& computers, const Traversal& traversal,
-              ElementForm form = ElementForm::path) {
+/** The pairs of the traversals, in the order of the computers. */
+Pairs pairsOf(const ClientRequest& request, ProviderSession& session, const Traversals& traversals) {
     Pairs pairs;
-    for (const End& computer : computers) {
-        const LocalObject keys = localPath(computer.path, *findClass(computerClass));
-        if (form == ElementForm::instance) {
-            for (const CMPIInstance* instance : session.associators(keys, *traversal.association)) {
-                pairs.push_back({traversal, computer, {nullptr, instance}});
-            }
-        } else {
-            for (const CMPIObjectPath* path : session.associatorNames(keys, *traversal.association)) {
-                pairs.push_back({traversal, computer, {path, nullptr}});
-            }
+    const Ends computers = knownComputers(request, session);
+    for (const Traversal& traversal : traversals) {
+        for (const End& computer : computers) {
+            addPairs(pairs, session, traversal, computer);
         }
     }
     return pairs;
@@ -158,58 +161,44 @@ const End& at(const Property& end, const AssociationPair& pair) {
     return isComputerEnd(end) ? pair.computer : pair.element;
 }
 
-/**
- * A client's restriction. Names ignore letter case; null and the empty string mean any. The role is the property of the
- * association that refers to the source, the result role the one that refers to the target.
- */
-struct TraversalFilter {
-    const char* associationClass;
-    const char* role;
-    const char* resultRole;
-};
+const CMPIObjectPath*& requiredAt(const Property& end, Traversal& traversal) {
+    return isComputerEnd(end) ? traversal.computer : traversal.element;
+}
 
-/** The traversals that begin at the request's path, which must have keys, and that the filter admits. */
-Traversals traversalsFrom(const ClientRequest& request, const TraversalFilter& filter) {
+/**
+ * The traversals that begin at the request's path, which must have keys. Names ignore letter case; null and the empty
+ * string mean any. The role is the property of the association that refers to the path, the result role the other one.
+ */
+Traversals traversalsFrom(const ClientRequest& request, const char* associationClass, const char* role,
+                          const char* resultRole, ElementForm form = ElementForm::path) {
     failIf(keyCountOf(request.path) == 0, CMPI_RC_ERR_INVALID_PARAMETER,
            "Associations begin at an instance: the path needs its keys.");
     Traversals traversals;
     for (const Class& association : Classes()) {
-        if (!association.isAssociation || !matches(filter.associationClass, association.name)) {
+        if (!association.isAssociation || !matches(associationClass, association.name)) {
             continue;
         }
         const Property* one = association.begin();
         const Property* other = one + 1;
-        for (const Traversal& each : {Traversal{&association, one, other}, Traversal{&association, other, one}}) {
-            if (matches(filter.role, each.source->name) && matches(filter.resultRole, each.target->name) &&
-                isA(request, request.path, each.source->referenceClass)) {
-                traversals.push_back(each);
+        for (const auto& [source, target] : {std::pair(one, other), std::pair(other, one)}) {
+            if (matches(role, source->name) && matches(resultRole, target->name) &&
+                isA(request, request.path, source->referenceClass)) {
+                traversals.push_back({&association, form, target});
+                requiredAt(*source, traversals.back()) = request.path;
             }
         }
     }
     return traversals;
 }
 
-/**
- * Returns what `make(request, pair)` makes of each pair of the traversals, in one session.
- * @param form of the elements at the targets of the traversals
- */
+/** Returns what `make(request, pair)` makes of each pair of the traversals, in one session. */
 template <class Answers, class Make>
-Answers traverse(const ClientRequest& request, const Traversals& traversals, ElementForm form, Make make) {
+Answers traverse(const ClientRequest& request, const Traversals& traversals, Make make) {
     Answers answers;
-    if (traversals.empty()) {
-        return answers;
-    }
-    ProviderSession session(request);
-    const Computers computers = knownComputers(request, session);
-    for (const Traversal& traversal : traversals) {
-        const Property* source = traversal.source;
-        const bool isFromComputer = source != nullptr && isComputerEnd(*source);
-        const Pairs pairs = isFromComputer ? pairsOf(session, computerAt(request.path, computers), traversal, form)
-                                           : pairsOf(session, computers, traversal);
-        for (const AssociationPair& pair : pairs) {
-            if (source == nullptr || isFromComputer || samePath(pair.element.path, request.path)) {
-                answers.push_back(make(request, pair));
-            }
+    if (!traversals.empty()) {
+        ProviderSession session(request);
+        for (const AssociationPair& pair : pairsOf(request, session, traversals)) {
+            answers.push_back(make(request, pair));
         }
     }
     return answers;
@@ -260,9 +249,8 @@ void associators(const ClientRequest& request, const char* associationClass, con
         const PropertySelection selection(properties, *findClass(target.referenceClass));
         return selection.applied(request.broker(), at(target, pair).instance);
     };
-    const Traversals traversals = traversalsFrom(request, {associationClass, role, resultRole});
-    giveOfClass(request, resultClass, traverse<Instances>(request, traversals, ElementForm::instance, instanceAt),
-                pathOf);
+    const auto traversals = traversalsFrom(request, associationClass, role, resultRole, ElementForm::instance);
+    giveOfClass(request, resultClass, traverse<Instances>(request, traversals, instanceAt), pathOf);
 }
 
 void associatorNames(const ClientRequest& request, const char* associationClass, const char* resultClass,
@@ -270,45 +258,42 @@ void associatorNames(const ClientRequest& request, const char* associationClass,
     const auto targetOf = [](const ClientRequest&, const AssociationPair& pair) {
         return at(*pair.traversal.target, pair).path;
     };
-    const Traversals traversals = traversalsFrom(request, {associationClass, role, resultRole});
-    giveOfClass(request, resultClass, traverse<Paths>(request, traversals, ElementForm::path, targetOf),
+    const Traversals traversals = traversalsFrom(request, associationClass, role, resultRole);
+    giveOfClass(request, resultClass, traverse<Paths>(request, traversals, targetOf),
                 [](const CMPIObjectPath* path) { return path; });
 }
 
 void references(const ClientRequest& request, const char* associationClass, const char* role, const char**) {
-    const Traversals traversals = traversalsFrom(request, {associationClass, role, nullptr});
-    request.give(traverse<Instances>(request, traversals, ElementForm::path, associationInstance));
+    const Traversals traversals = traversalsFrom(request, associationClass, role, nullptr);
+    request.give(traverse<Instances>(request, traversals, associationInstance));
 }
 
 void referenceNames(const ClientRequest& request, const char* associationClass, const char* role) {
-    const Traversals traversals = traversalsFrom(request, {associationClass, role, nullptr});
-    request.give(traverse<Paths>(request, traversals, ElementForm::path, associationPath));
+    const Traversals traversals = traversalsFrom(request, associationClass, role, nullptr);
+    request.give(traverse<Paths>(request, traversals, associationPath));
 }
 
 Instances associationInstances(const ClientRequest& request, const Class& association) {
-    return traverse<Instances>(request, {Traversal{&association}}, ElementForm::path, associationInstance);
+    return traverse<Instances>(request, {Traversal{&association}}, associationInstance);
 }
 
 Paths associationPaths(const ClientRequest& request, const Class& association) {
-    return traverse<Paths>(request, {Traversal{&association}}, ElementForm::path, associationPath);
+    return traverse<Paths>(request, {Traversal{&association}}, associationPath);
 }
 
 const CMPIInstance* associationAt(const ClientRequest& request, const Class& association) {
     ProviderSession session(request);
-    const CMPIObjectPath* computer = nullptr;
+    Traversal traversal{&association};
     for (const Property& end : association) {
         const CMPIObjectPath* target = referenceOf(request.path, end.name);
         failIf(target == nullptr, CMPI_RC_ERR_INVALID_PARAMETER, "The path of a ", association.name, " needs the key ",
                end.name, " as a reference.");
-        computer = isComputerEnd(end) ? target : computer;
+        requiredAt(end, traversal) = target;
     }
-    const Computers computers = computerAt(computer, knownComputers(request, session));
-    for (const AssociationPair& pair : pairsOf(session, computers, {&association})) {
-        if (samePath(associationPath(request, pair), request.path)) {
-            return associationInstance(request, pair);
-        }
-    }
-    fail(CMPI_RC_ERR_NOT_FOUND, "There is no such ", association.name, ".");
+    const Pairs pairs = pairsOf(request, session, {traversal});
+    const bool isOther = pairs.empty() || keyCountOf(request.path) != association.propertyCount;
+    failIf(isOther, CMPI_RC_ERR_NOT_FOUND, "There is no such ", association.name, ".");
+    return associationInstance(request, pairs.front());
 }
 
 }  // namespace gate

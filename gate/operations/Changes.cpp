@@ -39,7 +39,7 @@ void requireKnownProperties(const Class& owner, const CMPIInstance* instance) {
 /** The identifier of a new record: from the path or, if that has none, from the instance. */
 std::string identifierOf(const CMPIObjectPath* path, const CMPIInstance* instance, const Property& key,
                          const Class& owner) {
-    std::string fromPath = keyOf(path, key).value_or(std::string());
+    std::string fromPath = keyOf(path, key.name, key.type).value_or(std::string());
     std::string fromInstance = propertyOf(instance, key).value_or(std::string());
     failIf(fromPath.empty() && fromInstance.empty(), CMPI_RC_ERR_INVALID_PARAMETER, "A new ", owner.name,
            " needs a value of its key ", key.name, ", in the path or in the instance.");

@@ -183,8 +183,8 @@ const CMPIBroker* ProviderConnection::broker() const {
 void ProviderConnection::shutdown(const CMPIContext* context) {
     std::exception_ptr failure;
     theRequestLock.close(drainTimeout, RequestLock::Closing::temporary, [&] {
-        auto* const instances = library.interface<CMPIInstanceMI>();
-        auto* const associations = library.interface<CMPIAssociationMI>();
+        auto* const instances = library.interfaceWith(&CMPIInstanceMIFT::cleanup);
+        auto* const associations = library.interfaceWith(&CMPIAssociationMIFT::cleanup);
         try {
             if (broker() != nullptr && instances != nullptr && associations != nullptr) {
                 instances->ft->cleanup(instances, context, 1);

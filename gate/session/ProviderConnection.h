@@ -33,9 +33,9 @@ public:
     /** Calls the factories, while it is loaded. Fails with CMPI_RC_ERR_FAILED unless both return an interface. */
     void createInterfaces(const CMPIBroker* broker);
 
-    /** The provider's interface of a type; null if there is none. */
-    template <class Interface>
-    Interface* interface() const {
+    /** The provider's interface that has a function of this type; null if there is none. */
+    template <class Table, class Interface, class... Arguments>
+    Interface* interfaceWith(CMPIStatus (*Table::*)(Interface*, Arguments...)) const {
         return std::get<Interface*>(interfaces);
     }
 

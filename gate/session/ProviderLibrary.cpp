@@ -9,14 +9,12 @@ namespace gate {
 
 namespace {
 
-constexpr const char* libraryName = "libLeaseAndWarrantyProvider.so";
-
 /** The provider's file: in the directory of the file that contains this function. */
 std::string libraryPath() {
     Dl_info self{};
     const bool isKnown = dladdr(reinterpret_cast<const void*>(&libraryPath), &self) != 0 && self.dli_fname != nullptr;
     const std::string file = isKnown ? self.dli_fname : "";
-    return file.substr(0, file.rfind('/') + 1) + libraryName;
+    return file.substr(0, file.rfind('/') + 1) + "libLeaseAndWarrantyProvider.so";
 }
 
 template <class Interface>

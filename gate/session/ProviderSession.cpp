@@ -28,8 +28,6 @@ const CMPIInstance* firstOf(const Instances& instances) {
     return instances.empty() ? nullptr : instances.front();
 }
 
-constexpr CMPIStatus done{CMPI_RC_OK, nullptr};
-
 /** The provider's answer to a request. Its objects belong to the object manager, which frees them with the request. */
 struct ProviderAnswer {
     Instances instances{};
@@ -37,8 +35,11 @@ struct ProviderAnswer {
     bool isDone = false;  ///< whether the provider called returnDone
 };
 
-ProviderAnswer& answerOf(const CMPIResult* result) {
-    return *static_cast<ProviderAnswer*>(result->hdl);
+/** Adds an object to one of the lists of the answer. */
+template <auto list, class Object>
+CMPIStatus collect(const CMPIResult* result, Object* object) {
+    (static_cast<ProviderAnswer*>(result->hdl)->*list).push_back(object);
+    return {CMPI_RC_OK, nullptr};
 }
 
 /** The functions that the provider calls, of a CMPI result that collects its answer to be checked. */
@@ -47,31 +48,19 @@ CMPIResultFT collectorFunctions{
     nullptr,
     nullptr,
     nullptr,
-    [](const CMPIResult* result, const CMPIInstance* instance) {
-        answerOf(result).instances.push_back(instance);
-        return done;
-    },
-    [](const CMPIResult* result, const CMPIObjectPath* path) {
-        answerOf(result).paths.push_back(path);
-        return done;
-    },
+    collect<&ProviderAnswer::instances>,
+    collect<&ProviderAnswer::paths>,
     [](const CMPIResult* result) {
-        answerOf(result).isDone = true;
-        return done;
+        static_cast<ProviderAnswer*>(result->hdl)->isDone = true;
+        return CMPIStatus{CMPI_RC_OK, nullptr};
     },
     nullptr,
 };
 
-/** The provider's interface that has a function of this type. */
-template <class Table, class Interface, class... Arguments>
-Interface* interfaceOf(CMPIStatus (*Table::*)(Interface*, Arguments...)) {
-    return theConnection.provider().interface<Interface>();
-}
-
 /** Calls a function of one of the provider's interfaces. */
 template <auto function, class... Arguments>
 ProviderAnswer call(const ClientRequest& request, const LocalObject& path, Arguments... arguments) {
-    auto* const interface = interfaceOf(function);
+    auto* const interface = theConnection.provider().interfaceWith(function);
     ProviderAnswer answer;
     const CMPIResult result{&answer, &collectorFunctions};
     theConnection.wrappedBroker().hasFailed = false;

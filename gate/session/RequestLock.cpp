@@ -20,16 +20,6 @@ RequestLock theRequestLock;
 
 /** A waiting thread, as an element of a list. */
 struct RequestLock::Waiter {
-    enum class Result { none, admitted, refused };
-
-    /** Wakes the thread. Called with the mutex locked, so that the waiter still exists. */
-    void end(Result itsResult) {
-        result = itsResult;
-        wakeUp.notify_one();
-    }
-
-    IfClosed ifClosed = IfClosed::fail;
-    Result result = Result::none;
     std::condition_variable wakeUp{};
     Waiter* next = nullptr;
 };
@@ -58,68 +48,55 @@ void RequestLock::endRequest() noexcept {
     const std::lock_guard<std::mutex> lock(mutex);
     --requests;
     --requestsHere;
-    notifyClosers();
+    notifyAll(closers);
 }
 
 bool RequestLock::acquire() noexcept {
     std::unique_lock<std::mutex> lock(mutex);
-    return state == State::open && waitForLock(lock, IfClosed::fail);
+    return state == State::open && waitForLock(lock, generation());
 }
 
-void RequestLock::reacquire() noexcept {
+bool RequestLock::reacquire(std::optional<std::size_t> itsGeneration) noexcept {
     std::unique_lock<std::mutex> lock(mutex);
-    waitForLock(lock, IfClosed::wait);
+    return waitForLock(lock, itsGeneration);
 }
 
-bool RequestLock::reacquire(std::size_t itsGeneration) noexcept {
-    std::unique_lock<std::mutex> lock(mutex);
-    return timesClosed == itsGeneration && waitForLock(lock, IfClosed::fail);
-}
-
-bool RequestLock::waitForLock(std::unique_lock<std::mutex>& lock, IfClosed ifClosed) {
-    if (isHeld || state == State::closed) {
-        Waiter self{ifClosed};
-        linkTo(nullptr, waiters) = &self;
-        self.wakeUp.wait(lock, [&] { return self.result != Waiter::Result::none; });
-        isHeldHere = self.result == Waiter::Result::admitted;
+/** Waits for the lock; with a generation, not beyond its end. Returns whether this thread holds the lock. */
+bool RequestLock::waitForLock(std::unique_lock<std::mutex>& lock, std::optional<std::size_t> itsGeneration) {
+    Waiter self;
+    linkTo(nullptr, waiters) = &self;
+    const auto isRefused = [&] { return itsGeneration && timesClosed != *itsGeneration; };
+    const auto isAdmitted = [&] { return waiters == &self && !isHeld && state != State::closed; };
+    self.wakeUp.wait(lock, [&] { return isRefused() || isAdmitted(); });
+    linkTo(&self, waiters) = self.next;
+    isHeldHere = !isRefused();
+    if (isHeldHere) {
+        isHeld = true;
     } else {
-        isHeld = isHeldHere = true;
+        notify();
     }
     return isHeldHere;
-}
-
-/** Empties the queue, except for the threads that wait for a closed lock. */
-void RequestLock::refuseWaiters() {
-    for (Waiter** link = &waiters; *link != nullptr;) {
-        Waiter& waiter = **link;
-        if (waiter.ifClosed == IfClosed::wait) {
-            link = &waiter.next;
-        } else {
-            *link = waiter.next;
-            waiter.end(Waiter::Result::refused);
-        }
-    }
 }
 
 void RequestLock::release() noexcept {
     const std::lock_guard<std::mutex> lock(mutex);
     isHeldHere = false;
     isHeld = false;
-    admitNext();
-    notifyClosers();
+    notify();
 }
 
-/** Passes the lock, if it is free and open, directly to the longest waiter, so that a newcomer cannot overtake it. */
-void RequestLock::admitNext() {
-    if (waiters != nullptr && !isHeld && state != State::closed) {
-        isHeld = true;
-        std::exchange(waiters, waiters->next)->end(Waiter::Result::admitted);
+/** Wakes the threads that may continue: the longest waiter, which a newcomer cannot overtake, and those in close(). */
+void RequestLock::notify() {
+    if (waiters != nullptr) {
+        waiters->wakeUp.notify_one();
     }
+    notifyAll(closers);
 }
 
-void RequestLock::notifyClosers() {
-    for (Waiter* closer = closers; closer != nullptr; closer = closer->next) {
-        closer->wakeUp.notify_one();
+/** Called with the mutex locked, so that the waiters still exist. */
+void RequestLock::notifyAll(Waiter* list) {
+    for (Waiter* waiter = list; waiter != nullptr; waiter = waiter->next) {
+        waiter->wakeUp.notify_one();
     }
 }
 
@@ -138,8 +115,9 @@ bool RequestLock::close(std::chrono::milliseconds drainTimeout, Closing closing,
     Waiter self;
     linkTo(nullptr, closers) = &self;
     const auto isClosedByOther = [&, before = generation()] { return timesClosed != before; };
+    const auto isFree = [&] { return !isHeld && waiters == nullptr; };
     self.wakeUp.wait_for(lock, drainTimeout, [&] { return requests <= requestsHere || isClosedByOther(); });
-    self.wakeUp.wait(lock, [&] { return !isHeld || isHeldHere || isClosedByOther(); });
+    self.wakeUp.wait(lock, [&] { return isFree() || isHeldHere || isClosedByOther(); });
     linkTo(&self, closers) = self.next;
     if (isClosedByOther()) {
         return false;
@@ -151,8 +129,8 @@ bool RequestLock::close(std::chrono::milliseconds drainTimeout, Closing closing,
     isHeld = wasHeld;
     state = State::closed;
     ++timesClosed;
-    refuseWaiters();
-    notifyClosers();
+    notifyAll(waiters);
+    notifyAll(closers);
     return true;
 }
 
@@ -160,7 +138,7 @@ bool RequestLock::open() noexcept {
     const std::lock_guard<std::mutex> lock(mutex);
     if (state == State::closed && !isPermanent) {
         state = State::open;
-        admitNext();
+        notify();
     }
     return state == State::open;
 }

@@ -9,6 +9,7 @@
 #include <cstddef>
 #include <functional>
 #include <mutex>
+#include <optional>
 
 #include "gate/cmpi/Failure.h"
 
@@ -40,10 +41,11 @@ public:
     bool acquire() noexcept;
     /** Passes the lock to the longest waiter. */
     void release() noexcept;
-    /** Acquires the lock after an intermediate release(). If the lock is closed, waits until it is opened. */
-    void reacquire() noexcept;
-    /** The same, but returns false without the lock if it has been closed since that generation. */
-    bool reacquire(std::size_t itsGeneration) noexcept;
+    /**
+     * Acquires the lock after an intermediate release(). If the lock is closed, waits until it is opened; with a
+     * generation, returns false without the lock if it has been closed since then.
+     */
+    bool reacquire(std::optional<std::size_t> itsGeneration = std::nullopt) noexcept;
 
     /** Number of shutdowns. A request of an earlier generation has lost its object manager. */
     std::size_t generation() const noexcept { return timesClosed; }
@@ -72,13 +74,11 @@ public:
 
 private:
     enum class State { open, closing, closed };
-    enum class IfClosed { fail, wait };
     struct Waiter;
 
-    bool waitForLock(std::unique_lock<std::mutex>& lock, IfClosed ifClosed);
-    void refuseWaiters();
-    void admitNext();
-    void notifyClosers();
+    bool waitForLock(std::unique_lock<std::mutex>& lock, std::optional<std::size_t> itsGeneration);
+    void notify();
+    static void notifyAll(Waiter* list);
     static Waiter*& linkTo(const Waiter* waiter, Waiter*& list);
     std::size_t count(Waiter* const& first) const noexcept;
 
@@ -139,6 +139,7 @@ public:
      */
     template <class Work>
     void releaseFor(Work work) {
+        const std::size_t generation = theRequestLock.generation();  // cannot change while the lock is held
         theRequestLock.release();
         isHeld = false;
         work();
@@ -149,7 +150,6 @@ public:
 private:
     CancellationDisabled cancellationDisabled;
     bool isHeld;
-    const std::size_t generation = theRequestLock.generation();  ///< cannot change while the lock is held
 };
 
 }  // namespace gate
