@@ -65,7 +65,7 @@ struct ScalarRange {
     const Scalar& operator[](std::size_t index) const { return first[index]; }
 };
 
-/** The elements of an array. They have memory of their own, since most values are not arrays and must be small. */
+/** The elements of an array, allocated separately: most values are not arrays, and must be small. */
 class ArrayElements {
 public:
     ArrayElements() = default;
