@@ -149,7 +149,7 @@ struct HttpServer::Endpoint {
         // Bytes that still arrive belong to the body of this request, not to the head of another.
         const bool isLast = exchange->isBodyIgnored || code != MHD_REQUEST_TERMINATED_COMPLETED_OK;
         connection.enter(isLast ? Connection::Phase::refusal : Connection::Phase::idle);
-        if (!isLast) {
+        if (!isLast && handler.isIdle()) {
             awaitInputBriefly(connection.socket());
         }
     }

@@ -45,6 +45,12 @@ public:
         std::size_t amount = 0;
     };
 
+    /** Whether no request has a share. */
+    bool isUnused() const {
+        const std::lock_guard<std::mutex> lock(mutex);
+        return held == 0;
+    }
+
     /** Whether a request waits for its share. */
     bool isAwaited() const {
         const std::lock_guard<std::mutex> lock(mutex);

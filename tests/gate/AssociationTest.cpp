@@ -137,6 +137,9 @@ TEST_F(AssociationTest, DoesNotFindAMissingAssociation) {
     };
     EXPECT_THAT(gate().getInstance(path("alpha", firstNode)), isAnswered(1));
     EXPECT_THAT(gate().getInstance(path("alpha", secondNode)), isRefused(CMPI_RC_ERR_NOT_FOUND, leaseSetting));
+    ObjectPath longer = path("alpha", firstNode);
+    longer.keys.push_back(named("Other", text("o")));
+    EXPECT_THAT(gate().getInstance(longer), isRefused(CMPI_RC_ERR_NOT_FOUND, leaseSetting));
     ObjectPath half = path("alpha", firstNode);
     half.keys.pop_back();
     EXPECT_THAT(gate().getInstance(half), isRefused(CMPI_RC_ERR_INVALID_PARAMETER, "Dependent"));
