@@ -100,7 +100,7 @@ void RequestLock::notifyAll(Waiter* list) {
     }
 }
 
-bool RequestLock::close(std::chrono::milliseconds drainTimeout, Closing closing,
+bool RequestLock::close(std::chrono::milliseconds timeout, Closing closing,
                         const std::function<void()>& atEnd) noexcept {
     if (process != 0 && process != durable::currentProcess()) {
         return false;  // the threads that hold the lock and the mutex are not in this process
@@ -116,7 +116,7 @@ bool RequestLock::close(std::chrono::milliseconds drainTimeout, Closing closing,
     linkTo(nullptr, closers) = &self;
     const auto isClosedByOther = [&, before = generation()] { return timesClosed != before; };
     const auto isFree = [&] { return !isHeld && waiters == nullptr; };
-    self.wakeUp.wait_for(lock, drainTimeout, [&] { return requests <= requestsHere || isClosedByOther(); });
+    self.wakeUp.wait_for(lock, timeout, [&] { return requests <= requestsHere || isClosedByOther(); });
     self.wakeUp.wait(lock, [&] { return isFree() || isHeldHere || isClosedByOther(); });
     linkTo(&self, closers) = self.next;
     if (isClosedByOther()) {

@@ -58,7 +58,7 @@ public:
      * @return whether this call has closed the lock
      */
     bool close(
-        std::chrono::milliseconds drainTimeout, Closing closing = Closing::temporary,
+        std::chrono::milliseconds timeout, Closing closing = Closing::temporary,
         const std::function<void()>& atEnd = [] {}) noexcept;
 
     /** Opens a closed lock. @return whether it is open now: it is not while closing, or if closed permanently */
