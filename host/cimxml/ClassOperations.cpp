@@ -148,7 +148,7 @@ OperationResult Operations::enumerateQualifiers(const Call& call) {
 
 OperationResult Operations::traverseClasses(const Call& call, const ObjectPath& path) const {
     const std::string name = classOf(call, path.className).name;
-    const AssociationFilter filter = call.arguments.filter();
+    const AssociationFilter filter = filterOf(call);
     const ClassTraversal traversal(call.schema, name, filter);
     Classes found =
         isReferenceOperation(call.operation) ? traversal.associations(filter.resultClass) : traversal.associated();

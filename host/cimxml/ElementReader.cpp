@@ -256,6 +256,9 @@ NamedValue ElementReader::property(const XmlElement& element, const Class* known
                                                       known->name + "." + declared->name + ".");
     }
     const auto isValue = [](const XmlElement& each) { return each.name.rfind("VALUE", 0) == 0; };
+    if (std::count_if(element.children.begin(), element.children.end(), isValue) > 1) {
+        invalid("Property " + name + " has several values.");
+    }
     const auto sentValue = std::find_if(element.children.begin(), element.children.end(), isValue);
     try {
         return {declared != nullptr ? declared->name : name,

@@ -162,11 +162,6 @@ OperationResult Operations::deleteInstance(const Call& call) {
 Response Operations::associate(const Call& call, Request request) const {
     const bool isReference = isReferenceOperation(request.operation);
     const auto& wanted = isReference ? request.filter.resultClass : request.filter.associationClass;
-    for (const auto& name : {request.filter.resultClass, request.filter.associationClass}) {
-        if (name && call.schema.findClass(*name) == nullptr) {
-            throw CimError(CMPI_RC_ERR_INVALID_PARAMETER, "There is no class " + *name + ".");
-        }
-    }
     const std::vector<const ServedClass*> served = registry.associations(request.path.nameSpace);
     const bool hasProvider = std::any_of(served.begin(), served.end(), [&](const ServedClass* each) {
         return !wanted || call.schema.isA(each->className, *wanted);
@@ -180,7 +175,7 @@ ResultCursor Operations::traversal(const Call& call, const ObjectPath& path) con
     Request request;
     request.operation = call.operation;
     request.path = path;
-    request.filter = call.arguments.filter();
+    request.filter = filterOf(call);
     request.properties = call.arguments.strings("PropertyList");
     return cursorOf(associate(call, std::move(request)), call.form, partsOf(call));
 }

@@ -170,4 +170,15 @@ const Class& Operations::classOf(const Call& call, const std::string& name) cons
     return *known;
 }
 
+/** The filter of a traversal, whose classes must exist. */
+AssociationFilter Operations::filterOf(const Call& call) const {
+    AssociationFilter filter = call.arguments.filter();
+    for (const auto& name : {filter.resultClass, filter.associationClass}) {
+        if (name && call.schema.findClass(*name) == nullptr) {
+            throw CimError(CMPI_RC_ERR_INVALID_PARAMETER, "There is no class " + *name + ".");
+        }
+    }
+    return filter;
+}
+
 }  // namespace cimhost::cimxml

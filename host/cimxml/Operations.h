@@ -130,6 +130,7 @@ private:
     OperationResult streamed(const Call& call, ResultCursor cursor) const;
 
     const Class& classOf(const Call& call, const std::string& name) const;
+    AssociationFilter filterOf(const Call& call) const;
     ObjectWriter writerFor(const Call& call) const { return {options.host, call.arguments.nameSpace()}; }
 
     const Schema& schema;

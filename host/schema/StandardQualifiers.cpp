@@ -89,7 +89,7 @@ QualifierDeclaration declaration(const Row& row) {
     QualifierDeclaration declared{row.name,   row.type,  row.isArray, Value::null(row.type, row.isArray),
                                   row.flavor, row.scope, true};
     if (row.type == CMPI_boolean) {
-        declared.defaultValue = Value::of(false);
+        declared.defaultValue = Value::of(cim::sameName(row.name, "In") || cim::sameName(row.name, "Read"));
     }
     return declared;
 }

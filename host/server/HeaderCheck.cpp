@@ -116,9 +116,9 @@ std::optional<HttpResponse> checkProtocol(const Headers& headers, const std::str
     if (headers.count(prefix + "CIMExport") != 0) {
         return refusal(501, "Export messages are not supported.", "unsupported-operation");
     }
-    const auto operation = headerIn(headers, prefix + "CIMOperation");
-    if (!operation || !cim::sameName(*operation, "MethodCall")) {
-        return refusal(400, "The header CIMOperation must be MethodCall.");
+    const bool hasOperation = headers.count(prefix + "CIMOperation") != 0;
+    if (!cim::sameName(headerIn(headers, prefix + "CIMOperation").value_or(""), "MethodCall")) {
+        return refusal(400, "The header CIMOperation must be MethodCall.", hasOperation ? "unsupported-operation" : "");
     }
     const auto version = headerIn(headers, prefix + "CIMProtocolVersion");
     const bool hasVersion = headers.count(prefix + "CIMProtocolVersion") != 0;

@@ -90,7 +90,12 @@ TEST_F(ClassOperationsTest, QualifierDeclarationsHaveTypeAndFlavor) {
     EXPECT_EQ(*key.attribute("NAME"), "Key");
     EXPECT_EQ(*key.attribute("TYPE"), "boolean");
     EXPECT_EQ(*key.attribute("OVERRIDABLE"), "false");
+    EXPECT_EQ(key.child("VALUE")->characters, "FALSE");
     EXPECT_EQ(returned(response("EnumerateQualifiers", "")).size(), schema.qualifiers().size());
+    for (const char* name : {"In", "Read"}) {
+        const XmlElement declared = returned(response("GetQualifier", value("QualifierName", name))).at(0);
+        EXPECT_EQ(declared.child("VALUE")->characters, "TRUE") << name;
+    }
 }
 
 TEST_F(ClassOperationsTest, QualifierDeclarationsHaveTheirScope) {
@@ -125,6 +130,10 @@ TEST_F(ClassOperationsTest, AssociationsOfClassesComeFromTheSchema) {
     EXPECT_THAT(namesOf("AssociatorNames", derived + value("Role", "to")), IsEmpty());
     EXPECT_THAT(namesOf("AssociatorNames", derived + value("ResultRole", "TO")), ElementsAre("Other"));
     EXPECT_THAT(namesOf("AssociatorNames", derived + className("ResultClass", "Base")), IsEmpty());
+    for (const char* filter : {"ResultClass", "AssocClass"}) {
+        EXPECT_EQ(statusOf(response("AssociatorNames", derived + className(filter, "Nothing"))),
+                  CMPI_RC_ERR_INVALID_PARAMETER);
+    }
     const XmlElement classes = response("Associators", derived);
     EXPECT_NE(returned(classes).at(0).child("CLASS"), nullptr);
     EXPECT_THAT(manager.requests, IsEmpty());

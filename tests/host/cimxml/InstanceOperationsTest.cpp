@@ -217,6 +217,8 @@ TEST_F(InstanceOperationsTest, WrongValuesAreRefusedBeforeTheProvider) {
         return statusOf(response(
             "CreateInstance", parameter("NewInstance", "<INSTANCE CLASSNAME=\"Derived\">" + property + "</INSTANCE>")));
     };
+    EXPECT_EQ(create("<PROPERTY NAME=\"Size\" TYPE=\"uint32\"><VALUE>1</VALUE><VALUE>2</VALUE></PROPERTY>"),
+              CMPI_RC_ERR_INVALID_PARAMETER);
     for (const char* wrong : {"-1", "4294967296", "many", "", "1.5", "0x"}) {
         EXPECT_EQ(
             create(std::string("<PROPERTY NAME=\"Size\" TYPE=\"uint32\"><VALUE>") + wrong + "</VALUE></PROPERTY>"),

@@ -87,7 +87,7 @@ TEST_F(HeaderCheckTest, OnlyNamesOfTheLoopbackInterfaceAreHostsWithoutAuthentica
 }
 
 TEST_F(HeaderCheckTest, HeadersOfTheOperationMustBeThere) {
-    EXPECT_EQ(with("CIMOperation", "MethodResponse").result(), "400");
+    EXPECT_EQ(with("CIMOperation", "MethodResponse").result(), "400 unsupported-operation");
     EXPECT_EQ(with("CIMOperation", "methodcall").result(), "200");
     EXPECT_EQ(with("CIMMethod", "").result(), "400 header-mismatch");
     EXPECT_EQ(with("CIMMethod", "GetClass").with("CIMObject", "").result(), "400 header-mismatch");
