@@ -13,7 +13,6 @@
 #include <chrono>
 #include <cstring>
 #include <memory>
-#include <thread>
 
 namespace cimhost::server {
 namespace {
@@ -131,10 +130,11 @@ void discardInput(int socket, std::size_t most) {
 }
 
 void awaitInputBriefly(int socket) {
-    constexpr int most = 50;
+    constexpr int most = 100;
     pollfd readable{socket, POLLIN, 0};
-    for (int attempts = 0; attempts < most && ::poll(&readable, 1, 0) == 0; ++attempts) {
-        std::this_thread::yield();
+    int count = 0;
+    for (int attempts = 0; attempts < most && count == 0; ++attempts) {
+        count = ::poll(&readable, 1, 0);
     }
 }
 

@@ -48,7 +48,8 @@ void discardInput(int socket, std::size_t most);
 
 /**
  * Waits for input without sleeping, for the time in which a client usually sends its next request. It is about as long
- * as it takes to put a thread to sleep and wake it.
+ * as it takes to put a thread to sleep and wake it. Does not yield the processor: other programs could use it for
+ * milliseconds.
  */
 void awaitInputBriefly(int socket);
 
