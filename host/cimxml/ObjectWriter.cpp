@@ -159,9 +159,10 @@ struct ClassTag {
 
     void append(std::string& xml, std::string_view element, const std::string& itsClassName) {
         if (start.empty() || className != itsClassName) {
+            std::string tag;  // without memory, the last one stays complete
+            appendStartTag(tag, element, [&] { appendAttribute(tag, "CLASSNAME", itsClassName); });
             className = itsClassName;
-            start.clear();
-            appendStartTag(start, element, [&] { appendAttribute(start, "CLASSNAME", className); });
+            start = std::move(tag);
         }
         xml += start;
     }
@@ -177,16 +178,18 @@ struct ObjectWriter::Tags {
     std::string origin{};
     std::string start{};
     std::string end{};
+    bool isComplete = false;
 
     /** Makes the tags again unless the last object had the same property or key at this position. */
     template <class Make>
     void update(const NamedValue& named, std::string_view itsOrigin, Make make) {
         const Value& value = named.value;
         const bool isSame = name == named.name && type == value.type && isArray == value.isArray &&
-                            isNull == value.isNull && origin == itsOrigin && !start.empty();
+                            isNull == value.isNull && origin == itsOrigin && isComplete;
         if (!isSame) {
             *this = {named.name, value.type, value.isArray, value.isNull, std::string(itsOrigin)};
             make();
+            isComplete = true;
         }
     }
 
