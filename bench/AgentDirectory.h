@@ -5,7 +5,7 @@
 namespace bench {
 
 /**
- * A temporary directory with an agent's configuration, without a log, and its data. Construct it before the agent's
+ * A temporary directory with an agent's data and a configuration that disables the log. Construct it before the agent's
  * libraries are loaded, since it sets their environment variable.
  */
 class AgentDirectory {

@@ -238,7 +238,7 @@ def growth_of(samples):
 
 
 def grown(samples, most_memory):
-    """Returns the growth of what has grown. The server opens files for short times."""
+    """Returns the resources that have grown, with their growth. The server opens files for short times."""
     limits = {"memory": most_memory, "open files": 8, "threads": 0}
     growths = {name: growth_of([each[name] for each in samples]) for name in samples[0]}
     return {name: growth for name, growth in growths.items() if growth > limits[name]}

@@ -20,8 +20,8 @@ namespace {
 constexpr mode_t modeOfNewFiles = 0640;
 constexpr int everyOpening = O_CLOEXEC | O_NOCTTY | O_NONBLOCK;
 
-/** @return errno value; 0 for an ordinary file */
-int checkOrdinary(int file) {
+/** @return errno value; 0 for a regular file */
+int checkRegular(int file) {
     struct stat status {};
     if (::fstat(file, &status) != 0) {
         return errno;
@@ -147,7 +147,7 @@ Agent::FileDescriptor openFile(const std::wstring& path, unsigned long mode) {
     if (file.get() < 0) {
         throwFileError(failure, name, errno);
     }
-    if (const int error = checkOrdinary(file.get())) {
+    if (const int error = checkRegular(file.get())) {
         throwFileError(failure, name, error);
     }
     return file;

@@ -7,8 +7,8 @@
 namespace KO {
 
 /**
- * Opens an ordinary file in a FileMode.
- * @throws FrameworkException if it cannot be opened or is not an ordinary file
+ * Opens a regular file in a FileMode.
+ * @throws FrameworkException if it cannot be opened or is not a regular file
  */
 Agent::FileDescriptor openFile(const std::wstring& path, unsigned long mode);
 

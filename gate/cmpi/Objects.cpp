@@ -87,7 +87,7 @@ std::optional<CMPIUint32> numberIn(const std::string& digits, CMPIType type) {
     return error == std::errc() && number <= limit ? std::optional<CMPIUint32>(number) : std::nullopt;
 }
 
-/** Whether the second path has that key of the first one. */
+/** Whether the path has this key, with an equal value. */
 bool sameKey(const CMPIData& key, const char* name, const CMPIObjectPath* other) {
     const auto found = ask<&CMPIObjectPathFT::getKey>(other, name);
     require(found.isOk() || isAbsent(found.status), "return the keys of a path", found.status);

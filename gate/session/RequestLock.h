@@ -37,7 +37,7 @@ public:
     bool beginRequest() noexcept;
     void endRequest() noexcept;
 
-    /** Waits for the lock, behind all earlier callers. False, without the lock, if it is closing. */
+    /** Waits for the lock, behind all earlier callers. Returns false without it if the lock is closing. */
     bool acquire() noexcept;
     /** Passes the lock to the longest waiter. */
     void release() noexcept;

@@ -99,7 +99,7 @@ bool refusesLossyValues() {
     return &KO::Settings::getFlag == nullptr || KO::Settings::getFlag("gate.refuse_lossy_values", true);
 }
 
-/** Whether the changes remove a value. Two properties may show the same one. */
+/** Whether the changes remove a value. Two properties may have the same value. */
 bool isRemoved(const std::string& value, const DataFile& file, const CMPIInstance* before, const Values& changes) {
     return std::any_of(changes.begin(), changes.end(), [&](const auto& change) {
         const bool isNullDate = isDate(*change.first) && !isRepresentable(file, change.second);

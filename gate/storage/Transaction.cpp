@@ -116,7 +116,7 @@ void Transaction::apply(const CMPIInstance* current, const Values& changes) cons
     requireChanged(owner, file, current, session.get(path, owner), changes);
 }
 
-/** Fails if the provider has not as many records as its file, so that its next write would lose some. */
+/** Fails if the provider and its file have different numbers of records: the next write could lose some. */
 void Transaction::requireTable() const {
     if (!file.hasRecords || (theConnection.tableOf(owner)->isVerified && file.records().isStored())) {
         return;

@@ -42,7 +42,7 @@ Response bufferResponse(const std::string& body) {
 
 /**
  * A short text as it is, with its length; a long one in chunks that are written when they are sent. After a response
- * in chunks, all of the connection are: OpenPegasus' client library expects them.
+ * in chunks, all later ones of the connection have chunks: OpenPegasus' client library expects them.
  */
 Response textResponse(CimReply reply, Connection& connection) {
     if (reply.isComplete && !connection.usesChunks) {

@@ -116,7 +116,7 @@ def check_get(run, cls, instance):
 
 
 def absent(path, key):
-    """Returns a path without instance: the key has another value, or a key of its value if that is a path."""
+    """Returns the path of a missing instance, with another value of the key; for a reference, of a key of it."""
     value = dict(path.keys)[key]
     return path.replaced(**{key: absent(value, value.keys[0][0]) if isinstance(value, Path) else "no such value"})
 

@@ -80,7 +80,7 @@ TEST(File, MustNotBeADirectory) {
     }
 }
 
-TEST(File, MustBeAnOrdinaryFile) {
+TEST(File, MustBeARegularFile) {
     const TemporaryDirectory directory;
     ASSERT_EQ(::mkfifo(directory.file("pipe").c_str(), 0600), 0);
     EXPECT_NE(failureOfOpening(directory.file("pipe"), 1), "");

@@ -38,7 +38,7 @@ protected:
         environment.restart(files);
     }
 
-    /** Makes a change after another process was the owner and was killed. */
+    /** Makes a change after the process that owned the directory was killed. */
     Response changeAfterOtherOwner(const Fault* fault) {
         environment.restart();
         leases();  // loads the provider

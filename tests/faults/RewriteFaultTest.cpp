@@ -134,7 +134,7 @@ TEST_F(RewriteFaultTest, AFailedCloseWritesTheCompleteFile) {
     }
 }
 
-TEST_F(RewriteFaultTest, ARestartLoadsCompleteRecordsAndCopiesInPlaceOfTheRest) {
+TEST_F(RewriteFaultTest, ARestartRepeatsTheFirstIncompleteRecordForTheRest) {
     completeFile();
     const std::vector<Lines> before = leasesListed();
     EXPECT_EQ(rewriteWith(writeFailing(1, true)), "");

@@ -5,7 +5,7 @@
 #include "durable/RecordFile.h"
 #include "support/FullDisk.h"
 
-// Power failures during changes, at each sync: what may be lost before is a subset of what may be lost then.
+// Power failures at each sync of a change. A failure between two syncs loses no more than one at the second.
 
 extern const bool agentHasNoLog = true;
 

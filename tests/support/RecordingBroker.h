@@ -25,7 +25,7 @@ using cimhost::lab::Manager;
  * the provider.
  *
  * Functions are named by table and function, as in the CMPI standard: "CMPIBrokerEncFT.newInstance",
- * "CMPIObjectPathFT.getKey", "CMPIStringFT.getCharPtr". Other names are a std::invalid_argument.
+ * "CMPIObjectPathFT.getKey", "CMPIStringFT.getCharPtr". Throws std::invalid_argument for other names.
  *
  * Calls of the test and the host are not recorded. Arguments are described in order: character pointers by their
  * characters ("null" for a null pointer), object paths as "root/cimv2:Class.Key="x"", instances by their path, strings
