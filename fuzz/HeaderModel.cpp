@@ -72,9 +72,10 @@ std::vector<HeaderRow> bodyRows() {
 }
 
 std::vector<HeaderRow> operationRows() {
-    const Refusal otherMessage{400, ""};
+    const Refusal noMessage{400, ""};
+    const Refusal otherMessage{400, "unsupported-operation"};
     return {{"CIMOperation", true,
-             {one("MethodCall"), one("methodcall"), absent(otherMessage), one("", otherMessage),
+             {one("MethodCall"), one("methodcall"), absent(noMessage), one("", otherMessage),
               one("MethodCal", otherMessage), one("MethodResponse", otherMessage),
               twice("MethodCall", "MethodCall", otherMessage)}},
             {"CIMProtocolVersion", true,
