@@ -85,7 +85,7 @@ std::array<std::optional<std::size_t>, recordFileCount> DataDirectory::recordCou
     const std::vector<RecordFile> files = recordFilesIn(path());
     for (std::size_t index = 0; index < counts.size(); ++index) {
         try {
-            counts[index] = RecordFile::promisedIn(files[index].content().value_or(std::string())).value_or(0);
+            counts[index] = RecordFile::declaredIn(files[index].content().value_or(std::string())).value_or(0);
         } catch (const std::system_error&) {
             counts[index] = std::nullopt;
         }

@@ -66,7 +66,7 @@ std::optional<std::string> RecordFile::content() const {
     return found ? std::optional<std::string>(copies.withoutLastLine(*found)) : std::nullopt;
 }
 
-std::optional<std::size_t> RecordFile::promisedIn(std::string_view content) {
+std::optional<std::size_t> RecordFile::declaredIn(std::string_view content) {
     std::string_view number = withoutLeadingSpace(content);
     number.remove_prefix(number.substr(0, 1) == "+" ? 1 : 0);
     std::uint32_t count = 0;
@@ -76,18 +76,18 @@ std::optional<std::size_t> RecordFile::promisedIn(std::string_view content) {
 
 std::size_t RecordFile::presentIn(std::string_view content) const {
     const std::size_t ended = endedLinesIn(withoutLeadingSpace(content));
-    return std::min(promisedIn(content).value_or(0), ended == 0 ? 0 : (ended - 1) / lines);
+    return std::min(declaredIn(content).value_or(0), ended == 0 ? 0 : (ended - 1) / lines);
 }
 
 bool RecordFile::isComplete(std::string_view content) const {
-    const auto promised = promisedIn(content);
+    const auto declared = declaredIn(content);
     const bool hasHoles = content.find('\0') != std::string_view::npos;  // left by a file system that lost power
-    const bool hasEnd = promised == 0U || endsWith(content, "\n");
-    return promised && !hasHoles && hasEnd && presentIn(content) == *promised;
+    const bool hasEnd = declared == 0U || endsWith(content, "\n");
+    return declared && !hasHoles && hasEnd && presentIn(content) == *declared;
 }
 
 bool RecordFile::addsNewRecord(std::string_view content, std::string_view former) const {
-    return !former.empty() && promisedIn(content) == promisedIn(former).value_or(0) + 1 &&
+    return !former.empty() && declaredIn(content) == declaredIn(former).value_or(0) + 1 &&
            endsWith(content, endOfNewRecord);
 }
 
@@ -204,8 +204,8 @@ void RecordFile::replace(std::string_view records) const {
 }
 
 std::string RecordFile::countsOf(std::string_view content) const {
-    const auto promised = promisedIn(content);
-    return promised ? " was incomplete (records promised: " + std::to_string(*promised) +
+    const auto declared = declaredIn(content);
+    return declared ? " was incomplete (records declared: " + std::to_string(*declared) +
                           ", present: " + std::to_string(presentIn(content)) + ")."
                     : " had no count of records.";
 }

@@ -34,12 +34,12 @@ public:
     std::optional<std::string> content() const;
 
     /** The number of records that the first line promises; none if it is not an unsigned 32-bit number. */
-    static std::optional<std::size_t> promisedIn(std::string_view content);
+    static std::optional<std::size_t> declaredIn(std::string_view content);
 
     /** The number of records whose lines are all there. */
     std::size_t presentIn(std::string_view content) const;
 
-    /** Whether the content has the promised records and its last line ends. Later lines do not matter. */
+    /** Whether the content has the declared records and its last line ends. Later lines do not matter. */
     bool isComplete(std::string_view content) const;
 
     /**

@@ -31,12 +31,12 @@ constexpr std::array associationClasses{Association{"VELKO_LeaseSetting", leaseS
                                         Association{"VELKO_WarrantySetting", warrantyStore}};
 
 /** The paths of an association and of its two ends. */
-struct Link {
+struct AssociationPair {
     ObjectPath computer;
     ObjectPath element;
     ObjectPath association;
 
-    Link(const Association& itsAssociation, const std::string& nameSpace)
+    AssociationPair(const Association& itsAssociation, const std::string& nameSpace)
         : computer{"", nameSpace, "VELKO_ComputerSystem", {{"Name", testsupport::text("testhost")}}},
           element{
               "", nameSpace, itsAssociation.store().className, {{"InstanceID", testsupport::text(placeOfComputer)}}},
@@ -65,20 +65,20 @@ bool isPathOf(const ObjectPath& sent, const ObjectPath& path) {
 }
 
 /** The result of a traversal from one end to the other; none if the request does not ask for it. */
-std::optional<ObjectPath> resultOf(const Call& call, const Link& link, bool isFromComputer) {
+std::optional<ObjectPath> resultOf(const Call& call, const AssociationPair& pair, bool isFromComputer) {
     const cimhost::AssociationFilter& filter = call.request.filter;
-    const ObjectPath& source = isFromComputer ? link.computer : link.element;
-    const ObjectPath& target = isFromComputer ? link.element : link.computer;
+    const ObjectPath& source = isFromComputer ? pair.computer : pair.element;
+    const ObjectPath& target = isFromComputer ? pair.element : pair.computer;
     const bool isReference = cimhost::isReferenceOperation(call.request.operation);
-    const bool isAdmitted = isReference ? admits(filter.resultClass, link.association.className)
-                                        : admits(filter.associationClass, link.association.className) &&
+    const bool isAdmitted = isReference ? admits(filter.resultClass, pair.association.className)
+                                        : admits(filter.associationClass, pair.association.className) &&
                                               admits(filter.resultClass, target.className) &&
                                               admits(filter.resultRole, isFromComputer ? elementRole : computerRole);
     if (!isAdmitted || !admits(filter.role, isFromComputer ? computerRole : elementRole) ||
         !isPathOf(call.request.path, source)) {
         return std::nullopt;
     }
-    return isReference ? link.association : target;
+    return isReference ? pair.association : target;
 }
 
 std::vector<std::string> expectedPaths(const Call& call, const Snapshot& stored, std::size_t computers) {
@@ -87,15 +87,15 @@ std::vector<std::string> expectedPaths(const Call& call, const Snapshot& stored,
         if (computers != oneComputer || findElement(association, stored) == nullptr) {
             continue;
         }
-        const Link link(association, call.request.path.nameSpace);
+        const AssociationPair pair(association, call.request.path.nameSpace);
         if (!cimhost::isAssociationOperation(call.request.operation)) {
             if (cim::sameName(call.request.path.className, association.name)) {
-                paths.push_back(cimhost::formatObjectPath(link.association));
+                paths.push_back(cimhost::formatObjectPath(pair.association));
             }
             continue;
         }
         for (const bool isFromComputer : {true, false}) {
-            if (const auto result = resultOf(call, link, isFromComputer)) {
+            if (const auto result = resultOf(call, pair, isFromComputer)) {
                 paths.push_back(cimhost::formatObjectPath(*result));
             }
         }
@@ -122,8 +122,8 @@ void requireValues(const Call& call, const cimhost::Instance& instance, const Sn
 /** Whether a request begins at an instance that may have associations, so that it succeeds. */
 bool isTraversal(const Call& call) {
     return std::any_of(std::begin(associationClasses), std::end(associationClasses), [&](const Association& each) {
-        const Link link(each, "root/cimv2");
-        return isPathOf(call.request.path, link.computer) || isPathOf(call.request.path, link.element);
+        const AssociationPair pair(each, "root/cimv2");
+        return isPathOf(call.request.path, pair.computer) || isPathOf(call.request.path, pair.element);
     });
 }
 
@@ -149,8 +149,8 @@ Call nextTraversal(Bytes& bytes) {
                                     Operation::referenceNames};
     Call call;
     call.request.operation = bytes.pick(operations);
-    const Link link(bytes.pick(associationClasses), "root/cimv2");
-    call.request.path = bytes.below(2) == 0 ? link.computer : link.element;
+    const AssociationPair pair(bytes.pick(associationClasses), "root/cimv2");
+    call.request.path = bytes.below(2) == 0 ? pair.computer : pair.element;
     cimhost::AssociationFilter& filter = call.request.filter;
     for (auto* name : {&filter.associationClass, &filter.resultClass, &filter.role, &filter.resultRole}) {
         *name = nextFilter(bytes);

@@ -126,8 +126,8 @@ void Transaction::requireTable() const {
         storeTable(paths.front());
     }
     const durable::RecordFile records = file.records();
-    const auto promised = durable::RecordFile::promisedIn(records.content().value_or(std::string()));
-    if (promised.value_or(0) != paths.size() || records.needsRecovery()) {
+    const auto declared = durable::RecordFile::declaredIn(records.content().value_or(std::string()));
+    if (declared.value_or(0) != paths.size() || records.needsRecovery()) {
         theConnection.setOutdated();
         fail(CMPI_RC_ERR_FAILED, file.fileName,
              " has other records than the provider. It is read again; repeat the request.");

@@ -39,7 +39,7 @@ std::optional<std::string> OpenEnumerations::keep(OpenEnumeration enumeration, s
         identifier = randomIdentifier();
     }
     const Clock::time_point expires = now + enumeration.timeout;
-    kept.insert_or_assign(identifier, Kept{std::move(enumeration), expires});
+    entries.insert_or_assign(identifier, Entry{std::move(enumeration), expires});
     return identifier;
 }
 
@@ -47,19 +47,19 @@ std::optional<OpenEnumeration> OpenEnumerations::take(const std::string& identif
                                                       const std::string& principal, Clock::time_point now) {
     const std::lock_guard<std::mutex> lock(mutex);
     erase(now);
-    const auto found = kept.find(identifier);
-    if (found == kept.end() || !cim::sameName(found->second.enumeration.nameSpace, nameSpace) ||
+    const auto found = entries.find(identifier);
+    if (found == entries.end() || !cim::sameName(found->second.enumeration.nameSpace, nameSpace) ||
         found->second.enumeration.principal != principal) {
         return std::nullopt;
     }
     OpenEnumeration enumeration = std::move(found->second.enumeration);
-    kept.erase(found);
+    entries.erase(found);
     return enumeration;
 }
 
 std::size_t OpenEnumerations::size() const {
     const std::lock_guard<std::mutex> lock(mutex);
-    return kept.size();
+    return entries.size();
 }
 
 void OpenEnumerations::removeExpired(Clock::time_point now) {
@@ -69,8 +69,8 @@ void OpenEnumerations::removeExpired(Clock::time_point now) {
 
 /** Erases expired enumerations, with the mutex locked. */
 void OpenEnumerations::erase(Clock::time_point now) {
-    for (auto each = kept.begin(); each != kept.end();) {
-        each = each->second.expires <= now ? kept.erase(each) : std::next(each);
+    for (auto each = entries.begin(); each != entries.end();) {
+        each = each->second.expires <= now ? entries.erase(each) : std::next(each);
     }
 }
 
@@ -78,12 +78,12 @@ void OpenEnumerations::erase(Clock::time_point now) {
 bool OpenEnumerations::hasRoomFor(const OpenEnumeration& added) const {
     std::size_t results = added.cursor.left();
     std::size_t ofSameUser = 0;
-    for (const auto& [identifier, each] : kept) {
+    for (const auto& [identifier, each] : entries) {
         results += each.enumeration.cursor.left();
         ofSameUser += each.enumeration.principal == added.principal ? 1 : 0;
     }
     const std::size_t mostOfOneUser = added.principal.empty() ? limits.open : (limits.open + 1) / 2;
-    return kept.size() < limits.open && ofSameUser < mostOfOneUser && results <= limits.results;
+    return entries.size() < limits.open && ofSameUser < mostOfOneUser && results <= limits.results;
 }
 
 }  // namespace cimhost::cimxml

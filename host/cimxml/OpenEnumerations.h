@@ -79,7 +79,7 @@ public:
     std::size_t size() const;
 
 private:
-    struct Kept {
+    struct Entry {
         OpenEnumeration enumeration;
         Clock::time_point expires;
     };
@@ -89,7 +89,7 @@ private:
 
     EnumerationLimits limits;
     mutable std::mutex mutex;
-    std::map<std::string, Kept> kept;
+    std::map<std::string, Entry> entries;
 };
 
 }  // namespace cimhost::cimxml

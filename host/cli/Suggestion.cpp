@@ -30,9 +30,9 @@ std::string didYouMean(std::string_view word, const std::vector<std::string>& na
     std::string found;
     std::size_t least = std::max<std::size_t>(1, word.size() / 4) + 1;
     for (const std::string& name : names) {
-        const std::size_t far = distance(cim::foldedName(word), cim::foldedName(name));
-        if (far < least) {
-            least = far;
+        const std::size_t edits = distance(cim::foldedName(word), cim::foldedName(name));
+        if (edits < least) {
+            least = edits;
             found = name;
         }
     }

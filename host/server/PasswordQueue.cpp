@@ -15,12 +15,12 @@ bool PasswordQueue::acquire(Connection& connection, Connection::Clock::time_poin
         }
         add(waiter);
     }
-    connection.waitUntil(latest, [&] { return waiter.hasTurn.load(); });
+    connection.waitUntil(latest, [&] { return waiter.hasSlot.load(); });
     const std::lock_guard<std::mutex> lock(mutex);
-    if (!waiter.hasTurn) {
+    if (!waiter.hasSlot) {
         remove(waiter);
     }
-    return waiter.hasTurn;
+    return waiter.hasSlot;
 }
 
 std::size_t PasswordQueue::waiting() const {
@@ -73,7 +73,7 @@ void PasswordQueue::passOn() {
     } else {
         networks.splice(networks.end(), networks, networks.begin());
     }
-    next.hasTurn = true;
+    next.hasSlot = true;
     next.connection.wake();
 }
 

@@ -18,18 +18,18 @@ namespace cimhost::server {
 class PasswordQueue {
 public:
     /** The right to check a password, held until it is destroyed. */
-    class Turn {
+    class Slot {
     public:
         /** Waits for it, but not longer than until a time or until the connection is ended. */
-        Turn(PasswordQueue& itsQueue, Connection& connection, Connection::Clock::time_point latest)
+        Slot(PasswordQueue& itsQueue, Connection& connection, Connection::Clock::time_point latest)
             : queue(itsQueue), acquired(queue.acquire(connection, latest)) {}
-        ~Turn() {
+        ~Slot() {
             if (acquired) {
                 queue.release();
             }
         }
-        Turn(const Turn&) = delete;
-        Turn& operator=(const Turn&) = delete;
+        Slot(const Slot&) = delete;
+        Slot& operator=(const Slot&) = delete;
 
         explicit operator bool() const { return acquired; }
 
@@ -38,13 +38,13 @@ public:
         bool acquired;
     };
 
-    /** Number of connections that wait for their turn. */
+    /** Number of connections that wait for a slot. */
     std::size_t waiting() const;
 
 private:
     struct Waiter {
         Connection& connection;
-        std::atomic<bool> hasTurn{false};
+        std::atomic<bool> hasSlot{false};
     };
     struct Network {
         std::string name;

@@ -8,7 +8,8 @@ namespace {
 constexpr std::chrono::seconds authorizationLifetime{60};
 constexpr unsigned badRequest = 400;
 constexpr unsigned timeout = 408;
-constexpr std::size_t patience = 4;  ///< multiple of the largest request that is received although it is refused
+constexpr std::size_t refusedBodyFactor =
+    4;  ///< multiple of the largest request that is received although it is refused
 
 HttpResponse unauthorized() {
     HttpResponse response = refusal(401, "Send the name and password of a user who may use this server.");
@@ -87,8 +88,8 @@ std::optional<Right> RequestHandler::verified(Exchange& exchange, const std::str
     Connection& connection = *exchange.connection;
     const bool isKnown = connection.authorization == authorization && now < connection.authorizedUntil;
     if (!isKnown) {
-        const PasswordQueue::Turn turn(passwords, connection, now + settings.limits.queueTime);
-        if (!turn || connection.isEnding()) {
+        const PasswordQueue::Slot slot(passwords, connection, now + settings.limits.queueTime);
+        if (!slot || connection.isEnding()) {
             return std::nullopt;
         }
         if (!authenticator.accepts(credentials, connection.client().host())) {
@@ -114,7 +115,7 @@ bool RequestHandler::receive(Exchange& exchange, const char* data, std::size_t s
 }
 
 std::size_t RequestHandler::mostIgnored() const {
-    return patience * settings.limits.requestBytes;
+    return refusedBodyFactor * settings.limits.requestBytes;
 }
 
 Reply RequestHandler::finish(Exchange& exchange) {
@@ -136,7 +137,7 @@ Reply RequestHandler::answer(Exchange& exchange) {
     }
     exchange.connection->trust();
     try {
-        return performInTurn(exchange);
+        return performWhenFree(exchange);
     } catch (const cimxml::RequestRefused& refused) {
         return refusal(refused.httpStatus, refused.what(), refused.cimError);
     }
@@ -146,7 +147,7 @@ Reply RequestHandler::answer(Exchange& exchange) {
  * Lists have other places than short requests, which otherwise would wait for their results. While it waits for the
  * results of others, a list keeps its place.
  */
-Reply RequestHandler::performInTurn(Exchange& exchange) {
+Reply RequestHandler::performWhenFree(Exchange& exchange) {
     const auto latest = std::chrono::steady_clock::now() + settings.limits.queueTime;
     const bool returnsList = cimxml::Operations::returnsList(exchange.headers.method);
     Quota::Share place;

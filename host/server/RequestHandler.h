@@ -93,7 +93,7 @@ private:
     std::optional<HttpResponse> authenticate(Exchange& exchange, const HttpRequest& request);
     std::optional<Right> verified(Exchange& exchange, const std::string& authorization);
     Reply answer(Exchange& exchange);
-    Reply performInTurn(Exchange& exchange);
+    Reply performWhenFree(Exchange& exchange);
     Reply perform(Exchange& exchange, Quota::Share& place);
     cimxml::ResponseText respond(Exchange& exchange, const cimxml::Message& message);
 

@@ -7,22 +7,22 @@ from .wbemcli import Path
 COMPUTER = "VELKO_ComputerSystem"
 
 
-def associator_rows(run, cls, near, far):
+def associator_rows(run, cls, source, target):
     """Yields the options of requests from one end of the association to the other, and whether they find something."""
     yield {"ac": cls.name}, True
     if run.is_gate:
-        exact = {"ac": cls.name, "arc": far.reference_class, "ar": near.name, "arr": far.name}
+        exact = {"ac": cls.name, "arc": target.reference_class, "ar": source.name, "arr": target.name}
         yield exact, True
         yield {name: value.lower() for name, value in exact.items()}, True
         yield from (({"ac": cls.name, name: exact[name]}, True) for name in ("arc", "ar", "arr"))
-        for name, value in {"arc": "VELKO_OstrelAgent", "ar": far.name, "arr": near.name}.items():
+        for name, value in {"arc": "VELKO_OstrelAgent", "ar": target.name, "arr": source.name}.items():
             yield {"ac": cls.name, name: value}, False
 
 
-def reference_rows(cls, near, far):
+def reference_rows(cls, source, target):
     yield {"arc": cls.name}, True
-    yield {"arc": cls.name.lower(), "ar": near.name.lower()}, True
-    yield {"arc": cls.name, "ar": far.name}, False
+    yield {"arc": cls.name.lower(), "ar": source.name.lower()}, True
+    yield {"arc": cls.name, "ar": target.name}, False
 
 
 def check_rows(run, operations, path, rows, expected):
@@ -47,25 +47,25 @@ def check_end(run, cls, ends, path, far_paths, links):
 
 
 def check_association(run, cls):
-    near, far = sorted(cls.properties.values(), key=lambda end: end.reference_class != COMPUTER)
-    if far.reference_class not in run.tied:
-        run.report.note(f"{cls.name}: no {far.reference_class} belongs to the computer")
+    source, target = sorted(cls.properties.values(), key=lambda end: end.reference_class != COMPUTER)
+    if target.reference_class not in run.tied:
+        run.report.note(f"{cls.name}: no {target.reference_class} belongs to the computer")
         return
-    tied, own = run.tied[far.reference_class], run.records.get(far.reference_class)
-    computers, records, listed = (run.ask("ein", name).paths for name in (COMPUTER, far.reference_class, cls.name))
+    tied, own = run.tied[target.reference_class], run.records.get(target.reference_class)
+    computers, records, listed = (run.ask("ein", name).paths for name in (COMPUTER, target.reference_class, cls.name))
     held = {computer: run.ask("ain", computer, ac=cls.name).paths for computer in computers}
     run.check(f"computers that have {tied}", [tied in paths for paths in held.values()].count(True), 1)
 
     def link(computer, record):
-        return Path.of(cls.name, **{near.name: computer, far.name: record})
+        return Path.of(cls.name, **{source.name: computer, target.name: record})
 
     # The bare provider enumerates every record with the first computer, and returns all but the last for its record.
     pairs = held if run.is_gate else {computer: records for computer in computers[:1]}
     run.check(f"ein {cls.name}: pairs", set(listed),
               {link(computer, record) for computer in pairs for record in pairs[computer]})
     for computer, paths in held.items():
-        check_end(run, cls, (near, far), computer, paths, [link(computer, path) for path in paths])
+        check_end(run, cls, (source, target), computer, paths, [link(computer, path) for path in paths])
     for record in filter(None, (tied, own)):
         owners = [computer for computer, paths in held.items() if record in paths]
         bare = computers[:-1] if record == tied else []
-        check_end(run, cls, (far, near), record, run.by_provider(owners, bare), [link(each, record) for each in owners])
+        check_end(run, cls, (target, source), record, run.by_provider(owners, bare), [link(each, record) for each in owners])

@@ -242,8 +242,8 @@ TEST_F(DataTest, CheckReportsCompleteFiles) {
 
 TEST_F(DataTest, DamagedFilesAreReportedAndNotExported) {
     const std::vector<std::pair<std::string, std::string>> cases{
-        {content.substr(0, content.size() - 10), "Lease.dat was incomplete (records promised: 2, present: 1)."},
-        {"3" + content.substr(1), "Lease.dat was incomplete (records promised: 3, present: 2)."},
+        {content.substr(0, content.size() - 10), "Lease.dat was incomplete (records declared: 2, present: 1)."},
+        {"3" + content.substr(1), "Lease.dat was incomplete (records declared: 3, present: 2)."},
         {"two" + content.substr(1), "Lease.dat had no count of records."},
         {"", "Lease.dat had no count of records."},
     };

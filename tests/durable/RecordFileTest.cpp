@@ -97,18 +97,18 @@ TEST_F(RecordFileTest, AFileIsIncompleteIfItIsCutOrHasNoCount) {
 
 TEST_F(RecordFileTest, CountsTheRecordsOfAnIncompleteFile) {
     const std::string content = records({"W1", "W2", "W3"});
-    EXPECT_EQ(RecordFile::promisedIn(content), 3U);
+    EXPECT_EQ(RecordFile::declaredIn(content), 3U);
     EXPECT_EQ(file.presentIn(content), 3U);
     EXPECT_EQ(file.presentIn(content.substr(0, content.size() - 1)), 2U);
     EXPECT_EQ(file.presentIn("3\n"), 0U);
-    EXPECT_EQ(RecordFile::promisedIn("none"), std::nullopt);
+    EXPECT_EQ(RecordFile::declaredIn("none"), std::nullopt);
 }
 
 TEST_F(RecordFileTest, AnIncompleteFileIsRestoredFromTheSavedCopy) {
     writeFile(path, records({"W1"}));
     prepare();
     writeFile(path, "2\nW1\n");
-    EXPECT_THAT(file.recover(), AllOf(HasSubstr("Warranty.dat was incomplete (records promised: 2, present: 0)"),
+    EXPECT_THAT(file.recover(), AllOf(HasSubstr("Warranty.dat was incomplete (records declared: 2, present: 0)"),
                                       HasSubstr("restored from the saved copy of 20")));
     EXPECT_EQ(readFile(path), records({"W1"}));
     EXPECT_EQ(readFile(damaged), "2\nW1\n");
@@ -198,7 +198,7 @@ TEST_F(RecordFileTest, ASavedCopyThatIsCutIsNotUsed) {
 
 TEST_F(RecordFileTest, WithoutSavedCopyTheIncompleteFileStaysAndIsKept) {
     writeFile(path, records({"W1", "W2"}).substr(0, 45));
-    EXPECT_THAT(file.recover(), AllOf(HasSubstr("records promised: 2, present: 1"), HasSubstr(damaged.string())));
+    EXPECT_THAT(file.recover(), AllOf(HasSubstr("records declared: 2, present: 1"), HasSubstr(damaged.string())));
     EXPECT_EQ(readFile(path), records({"W1", "W2"}).substr(0, 45));
     EXPECT_EQ(readFile(damaged), readFile(path));
 }

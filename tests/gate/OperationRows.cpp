@@ -231,7 +231,7 @@ Rows settings(const RecordKind& kind) {
 struct Ends {
     const char* name;
     ObjectPath source;
-    std::string far;
+    std::string target;
     std::string associations;
     std::string bare;
 };
@@ -262,10 +262,10 @@ Rows associations(const RecordKind& kind) {
     Rows rows;
     for (const Ends& each : endsOf(kind)) {
         const std::string of = std::string(" of ") + each.name;
-        rows.push_back({"associators" + of, asked(Operation::associators, each.source, byAssociation), each.far,
+        rows.push_back({"associators" + of, asked(Operation::associators, each.source, byAssociation), each.target,
                         always(each.bare)});
         rows.push_back({"associator names" + of, asked(Operation::associatorNames, each.source, byAssociation),
-                        each.far, always(each.bare)});
+                        each.target, always(each.bare)});
         rows.push_back({"references" + of, asked(Operation::references, each.source, byResult), each.associations,
                         unsupportedReferences()});
         rows.push_back({"reference names" + of, asked(Operation::referenceNames, each.source, byResult),

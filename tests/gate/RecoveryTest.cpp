@@ -120,7 +120,7 @@ TEST_F(RecoveryTest, WithoutSavedCopyTheFileIsKeptAndItsCountsAreLogged) {
     writeFile(dataFile("Lease.dat"), cut);
     agentEnvironment::forgetLog();
     gate().instanceMI();
-    EXPECT_THAT(loggedErrors(), HasSubstr("Lease.dat was incomplete (records promised: 2, present: 1)."));
+    EXPECT_THAT(loggedErrors(), HasSubstr("Lease.dat was incomplete (records declared: 2, present: 1)."));
     EXPECT_EQ(readFile(dataFile("Lease.dat.damaged")), cut);
 }
 

@@ -46,10 +46,10 @@ protected:
         EXPECT_EQ(manager().perform(Request::enumerateInstances(classPath("Sample_Throwing"))).status.rc,
                   CMPI_RC_ERR_FAILED);
         const std::string role = "role " + std::to_string(number);
-        const auto far =
+        const auto target =
             manager().perform(Request::associators(named("Sample_Thing", "x"), {"Sample_Link", {}, role, {}}));
-        ASSERT_EQ(far.instances.size(), 1U) << far.status.message;
-        EXPECT_EQ(stringOf(far.instance().properties, "Asked"), "Sample_Link,none," + role + ",none");
+        ASSERT_EQ(target.instances.size(), 1U) << target.status.message;
+        EXPECT_EQ(stringOf(target.instance().properties, "Asked"), "Sample_Link,none," + role + ",none");
     }
 
     std::atomic<int> logged{0};

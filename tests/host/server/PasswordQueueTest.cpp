@@ -23,12 +23,12 @@ protected:
 
     static Connection::Clock::time_point later() { return Connection::Clock::now() + 1h; }
 
-    /** Starts a connection that waits for its turn, and notes its name then. */
+    /** Starts a connection that waits for its slot, and notes its name then. */
     void wait(const std::string& network, const std::string& name) {
         const std::size_t before = queue.waiting();
         threads.emplace_back([this, name, &connection = connect(network)] {
-            const PasswordQueue::Turn turn(queue, connection, later());
-            turns.push_back(turn ? name : "none");  // one thread at a time has the turn
+            const PasswordQueue::Slot slot(queue, connection, later());
+            turns.push_back(slot ? name : "none");  // one thread at a time has the slot
         });
         while (queue.waiting() == before) {
             std::this_thread::yield();
@@ -51,7 +51,7 @@ protected:
 };
 
 TEST_F(PasswordQueueTest, NetworksTakeTurns) {
-    std::optional<PasswordQueue::Turn> first(std::in_place, queue, connect("a"), later());
+    std::optional<PasswordQueue::Slot> first(std::in_place, queue, connect("a"), later());
     for (const auto& [network, name] : {std::pair{"a", "a1"}, {"a", "a2"}, {"a", "a3"}, {"b", "b1"}, {"c", "c1"}}) {
         wait(network, name);
     }
@@ -61,18 +61,18 @@ TEST_F(PasswordQueueTest, NetworksTakeTurns) {
 }
 
 TEST_F(PasswordQueueTest, ATurnThatDoesNotComeInTimeIsGivenToOthers) {
-    std::optional<PasswordQueue::Turn> first(std::in_place, queue, connect("a"), later());
-    EXPECT_FALSE(PasswordQueue::Turn(queue, connect("b"), Connection::Clock::now()));
+    std::optional<PasswordQueue::Slot> first(std::in_place, queue, connect("a"), later());
+    EXPECT_FALSE(PasswordQueue::Slot(queue, connect("b"), Connection::Clock::now()));
     EXPECT_EQ(queue.waiting(), 0U);
     wait("c", "c1");
     first.reset();
     finish();
     EXPECT_THAT(turns, testing::ElementsAre("c1"));
-    EXPECT_TRUE(PasswordQueue::Turn(queue, connect("b"), Connection::Clock::now()));
+    EXPECT_TRUE(PasswordQueue::Slot(queue, connect("b"), Connection::Clock::now()));
 }
 
 TEST_F(PasswordQueueTest, AConnectionThatIsEndedLeavesTheQueue) {
-    const PasswordQueue::Turn first(queue, connect("a"), later());
+    const PasswordQueue::Slot first(queue, connect("a"), later());
     wait("b", "b1");
     table.endAll();
     finish();

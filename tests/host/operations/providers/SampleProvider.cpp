@@ -187,9 +187,9 @@ CMPIStatus associators(CMPIAssociationMI*, const CMPIContext*, const CMPIResult*
 
 CMPIStatus associatorNames(CMPIAssociationMI*, const CMPIContext*, const CMPIResult* result, const CMPIObjectPath* path,
                            const char* association, const char*, const char*, const char*) {
-    CMPIObjectPath* far = kit::newPath(broker, path, "Sample_Far");
-    kit::addKey(far, "Asked", orNone(association));
-    result->ft->returnObjectPath(result, far);
+    CMPIObjectPath* target = kit::newPath(broker, path, "Sample_Far");
+    kit::addKey(target, "Asked", orNone(association));
+    result->ft->returnObjectPath(result, target);
     return kit::ok;
 }
 
