@@ -47,8 +47,8 @@ MEASURED = [
 
 # Requests that are also counted behind the gate, with the gate's function. After one request to the baseline, the
 # benchmark alternates between the provider alone and behind the gate.
-GATED = [(ENUM, "VELKO_Lease", 1000, "gate::*Entry<*enumerateInstances*>::call(*char const??)"),
-         (GET, "VELKO_Lease", 10, "gate::*Entry<*getInstance*>::call(*char const??)")]
+GATED = [(ENUM, "VELKO_Lease", 1000, "*runOperation<*enumerateInstances,*char const??)"),
+         (GET, "VELKO_Lease", 10, "*runOperation<*getInstance,*char const??)")]
 GATE_TURNS = 10
 
 # Highest ratio of provider to baseline.
