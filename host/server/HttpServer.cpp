@@ -89,6 +89,8 @@ struct HttpServer::Endpoint {
     MHD_Daemon* daemon = nullptr;
     bool isQuiet = false;
 
+    Endpoint(HttpServer& itsServer, Listener itsListener) : server(itsServer), listener(std::move(itsListener)) {}
+
     /** The server for the callbacks of the TLS library, which have no argument for it. One server uses TLS. */
     static std::atomic<HttpServer*> tlsServer;
 
@@ -290,7 +292,7 @@ HttpServer::~HttpServer() {
 }
 
 void HttpServer::listen(const Listener& listener) {
-    auto endpoint = std::unique_ptr<Endpoint>(new Endpoint{*this, listener});
+    auto endpoint = std::make_unique<Endpoint>(*this, listener);
     endpoint->socket = listener.descriptor >= 0 ? listener.descriptor : openSocket(listener);
     endpoint->listener.port = portOf(endpoint->socket);
     endpoint->start();
