@@ -200,7 +200,7 @@ void ElementReader::addKey(ObjectPath& path, const std::string& name, const XmlE
     }
     const bool isReference = element.name == "VALUE.REFERENCE";
     const CMPIType type = key != nullptr ? key->type : isReference ? CMPIType{CMPI_ref} : typeOfKey(element);
-    path.keys.push_back({key != nullptr ? key->name : name, value(element, type, false)});
+    path.keys.emplace_back(key != nullptr ? key->name : name, value(element, type, false));
 }
 
 Instance ElementReader::instance(const XmlElement& element) const {

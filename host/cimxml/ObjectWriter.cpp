@@ -146,8 +146,8 @@ void requireRepresentable(const Value& value, const std::string& className, cons
     for (const Scalar& scalar : value.elements()) {
         const auto* string = std::get_if<std::string>(&scalar);  // the usual case, without a call through a table
         if (string != nullptr ? !isRepresentable(*string) : !std::visit(ScalarCheck{}, scalar)) {
-            throw CimError(CMPI_RC_ERR_FAILED,
-                           "The value of " + className + "." + name + " has a character that XML cannot represent.");
+            throw CimError(CMPI_RC_ERR_FAILED, std::string("The value of ").append(className).append(".").append(name) +
+                                                   " has a character that XML cannot represent.");
         }
     }
 }

@@ -95,7 +95,7 @@ const Node* initializerOf(const Node& node) {
 void complete(Instance& instance, const Class& declared, const Node& node) {
     for (const Property& property : declared.properties) {
         if (!property.defaultValue.isNull && findNamed(instance.properties, property.name) == nullptr) {
-            instance.properties.push_back({property.name, property.defaultValue});
+            instance.properties.emplace_back(property.name, property.defaultValue);
         }
     }
     for (const Property* key : declared.keys()) {
