@@ -46,19 +46,17 @@ public:
             }
         }
         for (const Method& method : declared.methods) {
-            if (isLocalEnough(method.origin)) {
+            if (isLocalEnough(method.isPropagated)) {
                 append(method);
             }
         }
     }
 
 private:
-    bool isLocalEnough(const std::string& origin) const {
-        return !parts.localOnly || cim::sameName(origin, declared.name);
-    }
+    bool isLocalEnough(bool isPropagated) const { return !(parts.localOnly && isPropagated); }
 
     bool isWanted(const Property& property) const {
-        return isLocalEnough(property.origin) &&
+        return isLocalEnough(property.isPropagated) &&
                (!parts.properties ||
                 std::any_of(parts.properties->begin(), parts.properties->end(),
                             [&](const std::string& each) { return cim::sameName(each, property.name); }));
@@ -66,7 +64,7 @@ private:
 
     void appendQualifiers(const std::vector<Qualifier>& qualifiers) const {
         for (const Qualifier& each : qualifiers) {
-            if (parts.qualifiers && !(parts.localOnly && each.isPropagated)) {
+            if (parts.qualifiers && isLocalEnough(each.isPropagated)) {
                 append(each);
             }
         }
@@ -84,11 +82,12 @@ private:
         writer.appendValue(xml, qualifier.value);
     }
 
-    void appendOrigin(const std::string& origin) const {
+    template <class Feature>
+    void appendOrigin(const Feature& feature) const {
         if (parts.classOrigin) {
-            appendAttribute(xml, "CLASSORIGIN", origin);
+            appendAttribute(xml, "CLASSORIGIN", feature.origin);
         }
-        if (!cim::sameName(origin, declared.name)) {
+        if (feature.isPropagated) {
             appendFlag(xml, "PROPAGATED", true);
         }
     }
@@ -103,7 +102,7 @@ private:
             } else {
                 appendAttribute(xml, "TYPE", typeName(property.type));
             }
-            appendOrigin(property.origin);
+            appendOrigin(property);
         });
         appendQualifiers(property.qualifiers);
         writer.appendValue(xml, property.defaultValue);
@@ -115,7 +114,7 @@ private:
             if (method.type != CMPI_null) {
                 appendAttribute(xml, "TYPE", typeName(method.type));
             }
-            appendOrigin(method.origin);
+            appendOrigin(method);
         });
         appendQualifiers(method.qualifiers);
         for (const Property& parameter : method.parameters) {

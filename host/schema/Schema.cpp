@@ -17,8 +17,11 @@ void inheritQualifiers(std::vector<Qualifier>& own, const std::vector<Qualifier>
     }
 }
 
-void markPropagated(std::vector<Qualifier>& qualifiers) {
-    for (Qualifier& qualifier : qualifiers) {
+/** Marks an inherited property or method with its qualifiers. */
+template <class Element>
+void markPropagated(Element& inherited) {
+    inherited.isPropagated = true;
+    for (Qualifier& qualifier : inherited.qualifiers) {
         qualifier.isPropagated = true;
     }
 }
@@ -47,7 +50,7 @@ void checkUnique(const Class& declared) {
 std::vector<Property> mergeProperties(const Class& declared, const Class& super) {
     std::vector<Property> merged = super.properties;
     for (Property& inherited : merged) {
-        markPropagated(inherited.qualifiers);
+        markPropagated(inherited);
     }
     for (const Property& own : declared.properties) {
         Property* inherited = findNamed(merged, own.name);
@@ -57,6 +60,7 @@ std::vector<Property> mergeProperties(const Class& declared, const Class& super)
         }
         checkOverride(declared, own, *inherited);
         Property overriding = own;
+        overriding.origin = inherited->origin;
         inheritQualifiers(overriding.qualifiers, inherited->qualifiers);
         *inherited = std::move(overriding);
     }
@@ -67,11 +71,12 @@ std::vector<Method> mergeMethods(const Class& declared, const Class& super) {
     std::vector<Method> merged = declared.methods;
     for (const Method& inherited : super.methods) {
         if (Method* overriding = findNamed(merged, inherited.name)) {
+            overriding->origin = inherited.origin;
             inheritQualifiers(overriding->qualifiers, inherited.qualifiers);
             continue;
         }
         merged.push_back(inherited);
-        markPropagated(merged.back().qualifiers);
+        markPropagated(merged.back());
     }
     return merged;
 }

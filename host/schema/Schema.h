@@ -60,7 +60,8 @@ struct Property {
     std::string referenceClass{};  ///< of a reference, the class that it refers to; empty otherwise
     Value defaultValue{};          ///< of the property's type; null without a default
     std::vector<Qualifier> qualifiers{};
-    std::string origin{};  ///< name of the class that declares it
+    std::string origin{};       ///< name of the class that declares it first
+    bool isPropagated = false;  ///< inherited and not overridden
 
     const Qualifier* findQualifier(std::string_view qualifier) const { return cim::findNamed(qualifiers, qualifier); }
     bool isKey() const { return isTrue(findQualifier("Key")); }
@@ -73,6 +74,7 @@ struct Property {
 struct Method {
     std::string name{};
     std::string origin{};
+    bool isPropagated = false;
     CMPIType type = CMPI_null;  ///< of the return value
     std::vector<Qualifier> qualifiers{};
     std::vector<Property> parameters{};

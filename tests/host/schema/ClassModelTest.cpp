@@ -43,8 +43,10 @@ TEST(ClassModel, InheritedPropertiesComeFirstAndOverridingOnesTakeTheirPlace) {
     const Class& penguin = *schema.findClass("Penguin");
     EXPECT_THAT(names(penguin.properties), ElementsAre("Name", "Legs", "Note", "Flies"));
     EXPECT_EQ(penguin.findProperty("Name")->origin, "Animal");
-    EXPECT_EQ(penguin.findProperty("Legs")->origin, "Bird");
-    EXPECT_EQ(penguin.findProperty("Flies")->origin, "Penguin");
+    EXPECT_EQ(penguin.findProperty("Legs")->origin, "Animal");
+    EXPECT_EQ(penguin.findProperty("Flies")->origin, "Bird");
+    EXPECT_TRUE(penguin.findProperty("Legs")->isPropagated);
+    EXPECT_FALSE(penguin.findProperty("Flies")->isPropagated);
     EXPECT_EQ(element<std::uint8_t>(penguin.findProperty("Legs")->defaultValue), 2);
 }
 
@@ -97,7 +99,9 @@ TEST(ClassModel, MethodsAreInheritedByName) {
     const Schema schema = schemaOf("class A { uint32 Go(); uint32 Stop(); }; class B : A { uint32 go(); };");
     const Class& b = *schema.findClass("B");
     ASSERT_EQ(b.methods.size(), 2U);
-    EXPECT_EQ(b.methods[0].origin, "B");
+    EXPECT_EQ(b.methods[0].origin, "A");
+    EXPECT_FALSE(b.methods[0].isPropagated);
+    EXPECT_TRUE(b.methods[1].isPropagated);
     EXPECT_EQ(b.methods[1].name, "Stop");
 }
 
