@@ -38,9 +38,16 @@ std::optional<std::string> OpenEnumerations::keep(OpenEnumeration enumeration, s
         }
         identifier = randomIdentifier();
     }
-    const Clock::time_point expires = now + enumeration.timeout;
-    entries.insert_or_assign(identifier, Entry{std::move(enumeration), expires});
+    entries.insert_or_assign(identifier, Entry{std::move(enumeration)});
     return identifier;
+}
+
+void OpenEnumerations::startTimeout(const std::string& identifier, Clock::time_point now) {
+    const std::lock_guard<std::mutex> lock(mutex);
+    const auto found = entries.find(identifier);
+    if (found != entries.end()) {
+        found->second.expires = now + found->second.enumeration.timeout;
+    }
 }
 
 std::optional<OpenEnumeration> OpenEnumerations::take(const std::string& identifier, const std::string& nameSpace,

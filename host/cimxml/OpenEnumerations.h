@@ -63,11 +63,14 @@ public:
     explicit OpenEnumerations(const EnumerationLimits& itsLimits) : limits(itsLimits) {}
 
     /**
-     * Keeps an enumeration until it is taken or its timeout has passed.
+     * Keeps an enumeration until it is taken or the timeout has passed that startTimeout starts.
      * @param identifier the one that it had before; empty for a new enumeration
      * @return its identifier; none if too many enumerations are open, or they have too many results
      */
     std::optional<std::string> keep(OpenEnumeration enumeration, std::string identifier, Clock::time_point now);
+
+    /** Starts the timeout of an enumeration: the client has received the results before it, or has given up. */
+    void startTimeout(const std::string& identifier, Clock::time_point now);
 
     /** Removes and returns an enumeration; none if the client has no open enumeration of that identifier. */
     std::optional<OpenEnumeration> take(const std::string& identifier, const std::string& nameSpace,
@@ -81,7 +84,7 @@ public:
 private:
     struct Entry {
         OpenEnumeration enumeration;
-        Clock::time_point expires;
+        Clock::time_point expires = Clock::time_point::max();
     };
 
     void erase(Clock::time_point now);

@@ -30,6 +30,7 @@ struct OperationResult {
     std::function<bool(std::string& xml)> next{};  ///< appends an element of IRETURNVALUE; false at the end
     std::string parameters{};                      ///< elements PARAMVALUE
     std::size_t count = 0;                         ///< of the results, for the access log
+    std::shared_ptr<void> sending{};               ///< released when the response has been sent or given up
 };
 
 struct OperationsOptions {
@@ -54,7 +55,7 @@ public:
     OperationResult perform(const Message& message, const Caller& caller);
 
     /** Frees the results of open enumerations whose timeout has passed. To be called from time to time. */
-    void removeExpired() { enumerations.removeExpired(OpenEnumerations::Clock::now()); }
+    void removeExpired(OpenEnumerations::Clock::time_point now) { enumerations.removeExpired(now); }
 
     /** Whether an operation returns as many results as there are, or as the client asks for. */
     static bool returnsList(std::string_view method);
@@ -116,6 +117,7 @@ private:
     OperationResult open(const Call& call, ResultCursor cursor);
     OperationResult part(const Call& call, OpenEnumeration enumeration, const std::string& identifier,
                          std::uint32_t most);
+    std::string keep(OpenEnumeration enumeration, const std::string& identifier, OperationResult& result);
     ///@}
 
     Response send(const Call& call, Request request) const;

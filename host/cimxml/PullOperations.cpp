@@ -67,18 +67,24 @@ OperationResult Operations::part(const Call& call, OpenEnumeration enumeration, 
     }
     from.next += count;
     OperationResult result = streamed(call, std::move(part));
-    std::optional<std::string> context = "";
     const bool isAtEnd = from.left() == 0;
-    if (!isAtEnd) {
-        context = enumerations.keep(std::move(enumeration), identifier, OpenEnumerations::Clock::now());
-    }
+    const std::string context = isAtEnd ? "" : keep(std::move(enumeration), identifier, result);
+    appendParameter(result.parameters, "EnumerationContext", "string", context);
+    appendParameter(result.parameters, "EndOfSequence", "boolean", isAtEnd ? "TRUE" : "FALSE");
+    return result;
+}
+
+/** Keeps an enumeration of which the timeout starts after a result has been sent. @return its identifier */
+std::string Operations::keep(OpenEnumeration enumeration, const std::string& identifier, OperationResult& result) {
+    const auto context = enumerations.keep(std::move(enumeration), identifier, OpenEnumerations::Clock::now());
     if (!context) {
         throw CimError(serverLimitsExceeded,
                        "Too many enumerations are open, or they have too many results; try again later.");
     }
-    appendParameter(result.parameters, "EnumerationContext", "string", *context);
-    appendParameter(result.parameters, "EndOfSequence", "boolean", isAtEnd ? "TRUE" : "FALSE");
-    return result;
+    result.sending = std::shared_ptr<void>(nullptr, [this, started = *context](std::nullptr_t) {
+        enumerations.startTimeout(started, OpenEnumerations::Clock::now());
+    });
+    return *context;
 }
 
 OperationResult Operations::pull(const Call& call) {
@@ -95,6 +101,7 @@ OperationResult Operations::pull(const Call& call) {
     }
     if (found->cursor.form != call.form) {
         enumerations.keep(std::move(*found), identifier, now);
+        enumerations.startTimeout(identifier, now);
         throw CimError(invalidEnumerationContext, "This enumeration has results of the other kind.");
     }
     return part(call, std::move(*found), identifier, *most);

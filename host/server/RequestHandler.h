@@ -82,7 +82,7 @@ public:
     bool isShortOfResults() const { return results.isAwaited(); }
 
     /** Ends open enumerations whose timeout has passed. */
-    void removeExpired() { operations.removeExpired(); }
+    void removeExpired() { operations.removeExpired(cimxml::OpenEnumerations::Clock::now()); }
 
     /** From now on, requests are answered with 503. */
     void stop() { stopping = true; }

@@ -144,24 +144,41 @@ TEST(ResultCursorTest, AResultIsFreedWhenItIsWritten) {
     EXPECT_THAT(xml, testing::HasSubstr(">b<"));
 }
 
+TEST_F(PullOperationsTest, TheTimeoutStartsWhenTheResponseHasBeenSent) {
+    const Message message = readMessage(request("OpenEnumerateInstances", className("ClassName", "Other")));
+    const auto longAfter = OpenEnumerations::Clock::now() + std::chrono::hours(1);
+    options.limits.open = 1;
+    {
+        const ResponseText unsent(message, operations().perform(message, {}));
+        operations().removeExpired(longAfter);
+        EXPECT_EQ(statusOf(open("")), 27);
+    }
+    operations().removeExpired(longAfter);
+    EXPECT_EQ(statusOf(open("")), 0);
+}
+
 TEST(OpenEnumerationsTest, EnumerationsExpireAfterTheirTimeout) {
     OpenEnumerations enumerations({});
     const auto start = OpenEnumerations::Clock::now();
     OpenEnumeration enumeration;
     enumeration.nameSpace = "root/test";
     enumeration.timeout = std::chrono::seconds(5);
-    const auto identifier = enumerations.keep(enumeration, "", start);
-    ASSERT_TRUE(identifier);
-    EXPECT_FALSE(enumerations.take(*identifier, "root/test", "", start + std::chrono::seconds(5)));
+    const auto open = [&] {
+        const std::string identifier = enumerations.keep(enumeration, "", start).value();
+        enumerations.startTimeout(identifier, start);
+        return identifier;
+    };
+    const std::string identifier = open();
+    EXPECT_FALSE(enumerations.take(identifier, "root/test", "", start + std::chrono::seconds(5)));
     EXPECT_EQ(enumerations.size(), 0U);
-    enumerations.keep(enumeration, "", start);
+    open();
     enumerations.removeExpired(start + std::chrono::seconds(4));
     EXPECT_EQ(enumerations.size(), 1U);
     enumerations.removeExpired(start + std::chrono::seconds(5));
     EXPECT_EQ(enumerations.size(), 0U);
-    const auto another = enumerations.keep(enumeration, "", start);
-    EXPECT_TRUE(enumerations.take(*another, "ROOT/test", "", start + std::chrono::seconds(4)));
-    EXPECT_NE(*identifier, *another);
+    const std::string another = open();
+    EXPECT_TRUE(enumerations.take(another, "ROOT/test", "", start + std::chrono::seconds(4)));
+    EXPECT_NE(identifier, another);
 }
 
 }  // namespace
