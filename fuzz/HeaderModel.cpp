@@ -80,7 +80,7 @@ std::vector<HeaderRow> operationRows() {
               twice("MethodCall", "MethodCall", otherMessage)}},
             {"CIMProtocolVersion", true,
              {absent(right), one("1.0"), one("1.4"), one("2.0", otherVersion), one("10.0", otherVersion),
-              one("1", otherVersion), one("", otherVersion), twice("1.0", "2.0", otherVersion)}},
+              one("1", otherVersion), one("1.", otherVersion), one("1.x", otherVersion), one("", otherVersion), twice("1.0", "2.0", otherVersion)}},
             {"CIMBatch", true, {absent(right), one("", {501, "multiple-requests-unsupported"})}},
             {"CIMExport", true, {absent(right), one("x", {501, "unsupported-operation"})}},
             {"CIMMethod", true,

@@ -44,6 +44,9 @@ void OperationArguments::requireKnown(std::string_view names) const {
         if (!found.insert(name).second) {
             invalid(name, "is there twice");
         }
+        if (isOneOf("LocalOnly DeepInheritance IncludeQualifiers IncludeClassOrigin", name)) {
+            flag(name, false);  // must be a boolean also where the operation ignores it
+        }
     }
 }
 
@@ -111,6 +114,14 @@ std::string OperationArguments::requiredClassName(std::string_view name) const {
 std::string OperationArguments::requiredString(std::string_view name) const {
     required(name);
     return *string(name);
+}
+
+ObjectPath OperationArguments::path(std::string_view name) const {
+    const XmlElement& element = required(name);
+    if (element.name != "INSTANCENAME" && element.name != "CLASSNAME") {
+        invalid(name, "is neither an INSTANCENAME nor a CLASSNAME");
+    }
+    return elements.path(element);
 }
 
 AssociationFilter OperationArguments::filter() const {

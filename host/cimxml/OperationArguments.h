@@ -34,7 +34,8 @@ public:
     std::string requiredString(std::string_view name) const;
     const XmlElement& required(std::string_view name) const;
     AssociationFilter filter() const;
-    ObjectPath path(std::string_view name) const { return elements.path(required(name)); }
+    /** An INSTANCENAME or CLASSNAME; longer paths are refused, since the request names the namespace. */
+    ObjectPath path(std::string_view name) const;
 
 private:
     const Message& message;

@@ -90,6 +90,8 @@ QualifierDeclaration declaration(const Row& row) {
                                   row.flavor, row.scope, true};
     if (row.type == CMPI_boolean) {
         declared.defaultValue = Value::of(cim::sameName(row.name, "In") || cim::sameName(row.name, "Read"));
+    } else if (cim::sameName(row.name, "ArrayType")) {
+        declared.defaultValue = Value::of("Bag");
     }
     return declared;
 }

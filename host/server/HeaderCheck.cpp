@@ -122,7 +122,9 @@ std::optional<HttpResponse> checkProtocol(const Headers& headers, const std::str
     }
     const auto version = headerIn(headers, prefix + "CIMProtocolVersion");
     const bool hasVersion = headers.count(prefix + "CIMProtocolVersion") != 0;
-    if (hasVersion && (!version || version->rfind("1.", 0) != 0)) {
+    const bool isVersion1 = version && version->size() > 2 && version->rfind("1.", 0) == 0 &&
+                            version->find_first_not_of("0123456789", 2) == std::string::npos;
+    if (hasVersion && !isVersion1) {
         return refusal(400, "The header CIMProtocolVersion must be 1.0.", "unsupported-protocol-version");
     }
     return std::nullopt;

@@ -49,11 +49,13 @@ TEST_F(ClassOperationsTest, QualifiersShowWhetherTheyAreInherited) {
 }
 
 TEST_F(ClassOperationsTest, ClassOriginAndPropertyListAreApplied) {
-    const XmlElement found = getClass(
-        "Derived", value("LocalOnly", "false") + value("IncludeClassOrigin", "true") + properties({"name", "FLAG"}));
-    EXPECT_THAT(namesIn(found, "PROPERTY"), ElementsAre("Name", "Flag"));
+    const XmlElement found = getClass("Derived", value("LocalOnly", "false") + value("IncludeClassOrigin", "true") +
+                                                     properties({"name", "SIZE", "FLAG"}));
+    EXPECT_THAT(namesIn(found, "PROPERTY"), ElementsAre("Name", "Size", "Flag"));
     EXPECT_EQ(*found.children[1].attribute("CLASSORIGIN"), "Base");
-    EXPECT_EQ(*found.children[2].attribute("CLASSORIGIN"), "Derived");
+    EXPECT_EQ(*found.children[2].attribute("CLASSORIGIN"), "Base") << "overriding does not change the origin";
+    EXPECT_EQ(found.children[2].attribute("PROPAGATED"), nullptr);
+    EXPECT_EQ(*found.children[3].attribute("CLASSORIGIN"), "Derived");
     EXPECT_EQ(getClass("Base").child("PROPERTY")->attribute("CLASSORIGIN"), nullptr);
 }
 
@@ -92,9 +94,9 @@ TEST_F(ClassOperationsTest, QualifierDeclarationsHaveTypeAndFlavor) {
     EXPECT_EQ(*key.attribute("OVERRIDABLE"), "false");
     EXPECT_EQ(key.child("VALUE")->characters, "FALSE");
     EXPECT_EQ(returned(response("EnumerateQualifiers", "")).size(), schema.qualifiers().size());
-    for (const char* name : {"In", "Read"}) {
+    for (const auto& [name, byDefault] : {std::pair{"In", "TRUE"}, {"Read", "TRUE"}, {"ArrayType", "Bag"}}) {
         const XmlElement declared = returned(response("GetQualifier", value("QualifierName", name))).at(0);
-        EXPECT_EQ(declared.child("VALUE")->characters, "TRUE") << name;
+        EXPECT_EQ(declared.child("VALUE")->characters, byDefault) << name;
     }
 }
 

@@ -277,6 +277,27 @@ TEST_F(InstanceOperationsTest, PathsMustNameTheKeysOfTheClass) {
     EXPECT_EQ(get("<INSTANCENAME CLASSNAME=\"Base\"><KEYVALUE>a</KEYVALUE></INSTANCENAME>"), 0);
 }
 
+TEST_F(InstanceOperationsTest, APathInAParameterNamesNoNamespace) {
+    const std::string other =
+        "<LOCALINSTANCEPATH><LOCALNAMESPACEPATH><NAMESPACE NAME=\"other\"/></LOCALNAMESPACEPATH>" +
+        instanceName("Base", "a") + "</LOCALINSTANCEPATH>";
+    for (const std::string& path : {other, "<VALUE.REFERENCE>" + other + "</VALUE.REFERENCE>"}) {
+        EXPECT_EQ(statusOf(response("GetInstance", parameter("InstanceName", path))), CMPI_RC_ERR_INVALID_PARAMETER);
+        EXPECT_EQ(statusOf(response("Associators", parameter("ObjectName", path))), CMPI_RC_ERR_INVALID_PARAMETER);
+    }
+    EXPECT_THAT(manager.requests, IsEmpty());
+}
+
+TEST_F(InstanceOperationsTest, BooleansMustBeBooleansAlsoIfTheyAreIgnored) {
+    for (const char* name : {"LocalOnly", "IncludeQualifiers"}) {
+        const auto statusWith = [&](const char* characters) {
+            return statusOf(response("EnumerateInstances", className("ClassName", "Base") + value(name, characters)));
+        };
+        EXPECT_EQ(statusWith("TRUE"), 0);
+        EXPECT_EQ(statusWith("perhaps"), CMPI_RC_ERR_INVALID_PARAMETER);
+    }
+}
+
 TEST_F(InstanceOperationsTest, AssociatorsHavePathsWithHostAndNamespace) {
     manager.answer = [](const Request& request) {
         return returnsPaths(request.operation) ? Response::ofPaths({pathOf("Base", "b")})

@@ -100,7 +100,9 @@ TEST_F(HeaderCheckTest, HeadersOfTheOperationMustBeThere) {
 
 TEST_F(HeaderCheckTest, ProtocolVersionsAndGroupsOfTheFutureAreRefused) {
     EXPECT_EQ(with("CIMProtocolVersion", "1.4").result(), "200");
-    EXPECT_EQ(with("CIMProtocolVersion", "2.0").result(), "400 unsupported-protocol-version");
+    for (const char* version : {"2.0", "1.", "1.x", "11.0"}) {
+        EXPECT_EQ(with("CIMProtocolVersion", version).result(), "400 unsupported-protocol-version") << version;
+    }
     EXPECT_EQ(with("CIMProtocolVersion", "1.0").with("CIMBatch", "x").result(), "501 multiple-requests-unsupported");
     EXPECT_EQ(with("CIMBatch", "").with("CIMExport", "x").result(), "501 unsupported-operation");
 }
