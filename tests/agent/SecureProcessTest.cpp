@@ -5,16 +5,14 @@
 #include <unistd.h>
 
 #include <algorithm>
-#include <array>
-#include <cstdio>
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
-#include <memory>
 #include <sstream>
 #include <vector>
 
 #include "agent/Probe.h"
+#include "support/Command.h"
 
 using agent_test::ProbeResult;
 using testing::HasSubstr;
@@ -61,17 +59,6 @@ private:
     const char* name;
 };
 
-std::string outputOf(const std::string& command) {
-    const std::unique_ptr<FILE, int (*)(FILE*)> pipe(popen(command.c_str(), "r"), pclose);
-    std::string output;
-    std::array<char, 4096> buffer{};
-    for (std::size_t read = 1; pipe != nullptr && read > 0;) {
-        read = fread(buffer.data(), 1, buffer.size(), pipe.get());
-        output.append(buffer.data(), read);
-    }
-    return output;
-}
-
 }  // namespace
 
 TEST(SecureProcess, IgnoresTheCallersConfiguration) {
@@ -111,7 +98,7 @@ TEST(SecureProcess, IgnoresTheCallersPathsOfObjectManagerFiles) {
 TEST(SecureProcess, ReadsVariablesOnlyWithSecureGetenv) {
     std::istringstream shippedLibraries(SHIPPED_LIBRARIES);
     for (std::string library; std::getline(shippedLibraries, library, ':');) {
-        const std::string symbols = outputOf("nm --dynamic --undefined-only '" + library + "'");
+        const std::string symbols = testsupport::runCommand("nm --dynamic --undefined-only '" + library + "'").output;
         EXPECT_THAT(symbols, HasSubstr("@GLIBC")) << library << " was not read";
         EXPECT_THAT(symbols, Not(HasSubstr(" getenv"))) << library;
     }

@@ -142,9 +142,8 @@ protected:
     }
     ///@}
 
-    /** Expects that memory and file match the model. */
-    void expectAgreement() {
-        EXPECT_EQ(data().value_or("0\n"), model.written());
+    /** Expects that the records in memory match the model. */
+    void expectRecords() {
         const Outcome outcome = provider().enumerateInstances(allPath());
         EXPECT_THAT(outcome, isOk(1));
         std::vector<std::vector<std::string>> there;
@@ -154,17 +153,17 @@ protected:
         EXPECT_EQ(there, model.shownRecords());
     }
 
+    /** Expects that memory and file match the model. */
+    void expectAgreement() {
+        EXPECT_EQ(data().value_or("0\n"), model.written());
+        expectRecords();
+    }
+
     /** Expects that memory matches the model after the file was read. */
     void expectAgreementAfterRestart() {
         restartBoth();
         const std::string before = data().value_or("");
-        const Outcome outcome = provider().enumerateInstances(allPath());
-        EXPECT_THAT(outcome, isOk(1));
-        std::vector<std::vector<std::string>> there;
-        for (const Instance& instance : outcome.instances()) {
-            there.push_back(model.shownFields(instance));
-        }
-        EXPECT_EQ(there, model.shownRecords());
+        expectRecords();
         EXPECT_EQ(data().value_or(""), before);
     }
 

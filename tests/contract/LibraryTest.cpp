@@ -1,13 +1,11 @@
 #include <dlfcn.h>
 #include <elf.h>
 
-#include <array>
-#include <cstdio>
 #include <cstring>
-#include <memory>
 #include <stdexcept>
 
 #include "RecordFixture.h"
+#include "support/Command.h"
 #include "support/Files.h"
 #include "support/UnderTest.h"
 
@@ -81,23 +79,12 @@ TEST(LibraryFileTest, HasNoSymbolThatPreventsUnloading) {
     }
 }
 
-/** Returns the output of a shell command, including errors. */
-std::string outputOf(const std::string& command) {
-    const std::unique_ptr<FILE, int (*)(FILE*)> pipe(popen((command + " 2>&1").c_str(), "r"), pclose);
-    std::string output;
-    std::array<char, 4096> buffer{};
-    for (std::size_t read = 1; pipe != nullptr && read > 0;) {
-        read = fread(buffer.data(), 1, buffer.size(), pipe.get());
-        output.append(buffer.data(), read);
-    }
-    return output;
-}
-
 TEST(LibraryFileTest, LeavesNoSymbolUnresolved) {
     // The functions of a sanitizer's runtime are in the program, not in the libraries.
     const std::string output =
-        outputOf("ldd -r '" + libraryFile() +
-                 "' 2>&1 | grep -Ev 'undefined symbol: __(asan|lsan|tsan|ubsan|sanitizer|sancov)_'");
+        testsupport::runCommand("ldd -r '" + libraryFile() +
+                                "' 2>&1 | grep -Ev 'undefined symbol: __(asan|lsan|tsan|ubsan|sanitizer|sancov)_'")
+            .output;
     EXPECT_THAT(output, HasSubstr("libkoframework.so"));
     EXPECT_THAT(output, HasSubstr("librzlog.so"));
     EXPECT_THAT(output, Not(HasSubstr("undefined symbol")));

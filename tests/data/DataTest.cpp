@@ -1,13 +1,11 @@
-#include <sys/wait.h>
 #include <unistd.h>
 
-#include <cstdio>
 #include <functional>
 #include <nlohmann/json.hpp>
 #include <regex>
-#include <stdexcept>
 
 #include "gate/GateFixture.h"
+#include "support/Command.h"
 #include "support/Files.h"
 #include "support/UnderTest.h"
 
@@ -21,18 +19,9 @@ using nlohmann::ordered_json;
 using testing::AllOf;
 using testing::ElementsAre;
 using testing::HasSubstr;
+using testsupport::Ended;
 using testsupport::readFile;
 using testsupport::writeFile;
-
-/** A run of the program. */
-struct Ended {
-    int status;
-    std::string output;  ///< both streams
-};
-
-void PrintTo(const Ended& ended, std::ostream* stream) {
-    *stream << "status " << ended.status << ": " << ended.output;
-}
 
 testing::Matcher<const Ended&> hasEnded(int status, const std::string& words) {
     return AllOf(testing::Field("status", &Ended::status, status),
@@ -41,18 +30,7 @@ testing::Matcher<const Ended&> hasEnded(int status, const std::string& words) {
 
 /** @param before commands of the shell */
 Ended run(const std::string& arguments, const std::string& before = "") {
-    const std::string command =
-        "exec 2>&1; " + before + "exec " + testsupport::underTest(DATA_PROGRAM) + " " + arguments;
-    FILE* pipe = popen(command.c_str(), "r");
-    if (pipe == nullptr) {
-        throw std::runtime_error("no pipe");
-    }
-    std::string output;
-    for (int each = std::fgetc(pipe); each != EOF; each = std::fgetc(pipe)) {
-        output += static_cast<char>(each);
-    }
-    const int status = pclose(pipe);
-    return {WIFEXITED(status) ? WEXITSTATUS(status) : -1, output};
+    return testsupport::runCommand(before + "exec " + testsupport::underTest(DATA_PROGRAM) + " " + arguments);
 }
 
 class DataTest : public GateTest {

@@ -1,8 +1,6 @@
-#include <cstdio>
-#include <memory>
-
 #include "GateFixture.h"
 #include "broker/RequestScope.h"
+#include "support/Command.h"
 #include "support/UnderTest.h"
 
 // The built library file, its factories, loading and unloading.
@@ -14,16 +12,7 @@ using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
 using testing::Not;
-
-/** Returns the output of a shell command, including the error stream. */
-std::string outputOf(const std::string& command) {
-    const std::unique_ptr<FILE, int (*)(FILE*)> pipe(popen((command + " 2>&1").c_str(), "r"), &pclose);
-    std::string output;
-    for (int character = std::fgetc(pipe.get()); character != EOF; character = std::fgetc(pipe.get())) {
-        output += static_cast<char>(character);
-    }
-    return output;
-}
+using testsupport::runCommand;
 
 std::string gateFile() {
     return testsupport::underTest(GATE_LIBRARY);
@@ -32,12 +21,14 @@ std::string gateFile() {
 using LibraryTest = GateTest;
 
 TEST_F(LibraryTest, ExportsExactlyTheTwoFactories) {
-    EXPECT_EQ(outputOf("nm --dynamic --defined-only --format=posix " + gateFile() + " | cut -d' ' -f1,2 | sort"),
-              "LeaseAndWarrantyGate_Create_AssociationMI T\nLeaseAndWarrantyGate_Create_InstanceMI T\n");
+    EXPECT_EQ(
+        runCommand("nm --dynamic --defined-only --format=posix " + gateFile() + " | cut -d' ' -f1,2 | sort").output,
+        "LeaseAndWarrantyGate_Create_AssociationMI T\nLeaseAndWarrantyGate_Create_InstanceMI T\n");
 }
 
 TEST_F(LibraryTest, LoadsTheProviderFromItsOwnDirectory) {
-    EXPECT_THAT(outputOf("readelf --dynamic " + gateFile()), Not(HasSubstr("[libLeaseAndWarrantyProvider.so]")))
+    EXPECT_THAT(runCommand("readelf --dynamic " + gateFile()).output,
+                Not(HasSubstr("[libLeaseAndWarrantyProvider.so]")))
         << "it would be loaded before its files are recovered";
     EXPECT_FALSE(isLoaded(testsupport::underTest(PROVIDER_LIBRARY)));
     gate().instanceMI();
@@ -67,10 +58,10 @@ TEST_F(LibraryTest, ReportsAMissingProvider) {
 }
 
 TEST_F(LibraryTest, HasNoUndefinedSymbol) {
-    const std::string relocations = outputOf("LD_PRELOAD= ldd -r " + gateFile());
+    const std::string relocations = runCommand("LD_PRELOAD= ldd -r " + gateFile()).output;
     EXPECT_THAT(relocations, HasSubstr("libkoframework.so"));
     // In a build with sanitizers, the program defines their functions.
-    if (outputOf("nm --dynamic " + gateFile()).find("san_init") == std::string::npos) {
+    if (runCommand("nm --dynamic " + gateFile()).output.find("san_init") == std::string::npos) {
         EXPECT_THAT(relocations, Not(HasSubstr("undefined symbol")));
     }
     EXPECT_THAT(relocations, Not(HasSubstr("not found")));

@@ -15,18 +15,9 @@ protected:
     static std::string source() { return Kind::sourceFile; }
     static std::string named(const std::string& before) { return before + Kind::Store::name; }
 
-    /**
-     * Returns the messages that a function logs during an operation. Expects the source file's logger and flow level.
-     */
     template <class Operation>
     static std::vector<std::string> loggedBy(const std::string& function, Operation operation) {
-        agentEnvironment::forgetLog();
-        operation();
-        for (const LogRecord& record : recordsOf(source(), function)) {
-            EXPECT_EQ(record.logger, "Tarvik.LeaseAndWarrantyProvider");
-            EXPECT_EQ(record.level, 4000);
-        }
-        return logMessagesOf(source(), function);
+        return flowLoggedBy(source(), function, operation);
     }
 
     static std::vector<std::string> entryAndExit(const std::string& function, const std::string& list = {}) {

@@ -20,19 +20,9 @@ protected:
         return Words<Kind>::with(before, after);
     }
 
-    /**
-     * Returns the messages that a function logs during an operation. Expects the source file's logger and flow level.
-     */
     template <class Operation>
     static std::vector<std::string> loggedBy(const std::string& function, Operation operation) {
-        agentEnvironment::forgetLog();
-        operation();
-        for (const LogRecord& record : recordsOf(source(), function)) {
-            EXPECT_EQ(record.logger, "Tarvik.LeaseAndWarrantyProvider");
-            EXPECT_EQ(record.level, 4000);
-            EXPECT_GT(record.line, 0);
-        }
-        return logMessagesOf(source(), function);
+        return flowLoggedBy(source(), function, operation);
     }
 };
 

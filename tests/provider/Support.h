@@ -93,6 +93,22 @@ inline std::vector<std::string> logMessagesOf(const std::string& file, const std
     return found;
 }
 
+/**
+ * Returns the messages that a function of a source file logs during an operation. Expects the provider's logger, the
+ * flow level and a line.
+ */
+template <class Operation>
+std::vector<std::string> flowLoggedBy(const std::string& file, const std::string& function, Operation operation) {
+    agentEnvironment::forgetLog();
+    operation();
+    for (const LogRecord& record : recordsOf(file, function)) {
+        EXPECT_EQ(record.logger, "Tarvik.LeaseAndWarrantyProvider");
+        EXPECT_EQ(record.level, 4000);
+        EXPECT_GT(record.line, 0);
+    }
+    return logMessagesOf(file, function);
+}
+
 /** Return the entry and exit messages of a function. A parameter list must start with a blank. */
 inline std::string entering(const std::string& function, const std::string& file, const std::string& list = {}) {
     return "ENTERING: " + function + "() in " + file + " [Line: N]" +
