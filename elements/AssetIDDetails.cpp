@@ -1,11 +1,9 @@
 #include "AssetIDDetails.h"
 
 #include <algorithm>
-#include <array>
 #include <ctime>
 #include <optional>
 #include <type_traits>
-#include <variant>
 
 #include "AssetFile.h"
 #include "KO/File.h"
@@ -16,11 +14,7 @@
 #include "KO/Utils.h"
 #include "Trace.h"
 
-namespace KO {
-
-Mutex _fileMutex;
-
-}  // namespace KO
+KO::Mutex KO::_fileMutex;
 
 namespace KO::LeaseWarrantyProvider {
 
@@ -34,45 +28,7 @@ constexpr const char* assetCaption = "Asset ID Information";
 constexpr unsigned int assetStringArea = 1024;
 constexpr unsigned int presentTime = 3;
 
-/** Value of an empty label or data string, so that all five pairs have values. */
-constexpr const char* emptyPersonalized = "Null";
-
 }  // namespace
-
-/** The fixed fields, in the order in which they are read and written. */
-struct AssetIDDetails::StoredFields {
-    struct Field {
-        const char* key;
-        std::variant<std::string AssetIDDetails::*, DateTime AssetIDDetails::*> member;
-        const char* name;  ///< name of a string field in the trace
-    };
-
-    static constexpr std::array<Field, 11> all{{
-        {USER_ASSET_NUMBER_KEY, &AssetIDDetails::_AssetNumber, "_AssetNumber"},
-        {USER_ASSET_ID_TAG_KEY, &AssetIDDetails::_AssetIdTag, "_AssetIdTag"},
-        {USER_OWNER_NAME_KEY, &AssetIDDetails::_OwnerName, "_OwnerName"},
-        {USER_OWNER_PHONE_KEY, &AssetIDDetails::_OwnerPhone, "_OwnerPhone"},
-        {USER_OWNER_POSITION_KEY, &AssetIDDetails::_OwnerPosition, "_OwnerPosition"},
-        {USER_OWNER_DEPARTMENT_KEY, &AssetIDDetails::_OwnerDepartment, "_OwnerDepartment"},
-        {USER_LAST_INVENTORIED_KEY, &AssetIDDetails::_LastInventoried, nullptr},
-        {USER_SYSTEM_PURCHASE_DATE_KEY, &AssetIDDetails::_PurchaseDate, nullptr},
-        {USER_SYSTEM_LOCATION_KEY, &AssetIDDetails::_SystemLocation, "_SystemLocation"},
-        {USER_ZOPM_PROFILE_KEY, &AssetIDDetails::_ZOPMProfile, "_ZOPMProfile"},
-        {USER_ZOPM_UPDATE_TIME_KEY, &AssetIDDetails::_ZOPMUpdateTime, nullptr},
-    }};
-};
-
-/** Calls onText for each string field and onDate for each date field, in order. */
-template <class OnText, class OnDate>
-void AssetIDDetails::forEachField(OnText onText, OnDate onDate) {
-    for (const auto& field : StoredFields::all) {
-        if (const auto* text = std::get_if<std::string AssetIDDetails::*>(&field.member)) {
-            onText(field, this->**text);
-        } else {
-            onDate(field, this->*std::get<DateTime AssetIDDetails::*>(field.member));
-        }
-    }
-}
 
 AssetIDDetails::AssetIDDetails() : _FileName(getFileName()) {
     const Traced traced(at(traceSource));
@@ -135,11 +91,8 @@ void AssetIDDetails::flushAssetData() {
         PropertyFile file{File::Path(_FileName)};
         const FileLock lock;
         file.open(FILE_MODE_WRITE);
-        forEachField([&](const StoredFields::Field& field,
-                         const std::string& text) { Utils::WriteStringToFile(file, field.key, text); },
-                     [&](const StoredFields::Field& field, const DateTime& date) {
-                         Utils::WriteDateToFile(file, field.key, date);
-                     });
+        forEachField([&](const auto& field, const auto& text) { Utils::WriteStringToFile(file, field.key, text); },
+                     [&](const auto& field, const auto& date) { Utils::WriteDateToFile(file, field.key, date); });
         for (std::size_t pair = 0; pair < std::min(pairCount, _PersonalizedData.size()); ++pair) {
             Utils::WriteStringToFile(file, pairKeys[pair].label, _PersonalizedData[pair].first);
             Utils::WriteStringToFile(file, pairKeys[pair].data, _PersonalizedData[pair].second);
