@@ -63,42 +63,42 @@ void Operations::requireProvider(const Call& call, const ObjectPath& path, int c
     }
 }
 
-Response Operations::enumerate(const Call& call, Request request) const {
-    const ObjectPath path = request.path;
-    std::vector<std::string> names{path.className};
-    for (const Class* subclass : call.schema.subclasses(path.className)) {
+Response Operations::enumerate(const Call& call, const std::string& className, const PropertyList& properties) const {
+    const std::string& nameSpace = call.arguments.nameSpace();
+    std::vector<std::string> names{className};
+    for (const Class* subclass : call.schema.subclasses(className)) {
         names.push_back(subclass->name);
     }
     Response all;
-    bool isServed = call.schema.findClass(path.className) != nullptr;
+    bool isServed = call.schema.findClass(className) != nullptr;
     for (const std::string& name : names) {
-        const bool hasProvider = registry.find(path.nameSpace, name, InterfaceKind::instance) != nullptr;
+        const bool hasProvider = registry.find(nameSpace, name, InterfaceKind::instance) != nullptr;
         if (!hasProvider && !call.isInterop) {
             continue;
         }
         isServed = isServed || hasProvider;
-        request.path.className = name;
-        Response response = send(call, request);
+        Request request;
+        request.operation = call.operation;
+        request.path = {"", nameSpace, name, {}};
+        request.properties = properties;
+        Response response = send(call, std::move(request));
         moveAll(response.instances, all.instances);
         moveAll(response.paths, all.paths);
     }
     if (!isServed) {
-        throw CimError(CMPI_RC_ERR_INVALID_CLASS, "There is no class " + path.className + ".");
+        throw CimError(CMPI_RC_ERR_INVALID_CLASS, "There is no class " + className + ".");
     }
     return all;
 }
 
 ResultCursor Operations::enumeration(const Call& call) const {
-    Request request;
-    request.operation = call.operation;
-    request.path.nameSpace = call.arguments.nameSpace();
-    request.path.className = call.arguments.requiredClassName("ClassName");
+    const std::string className = call.arguments.requiredClassName("ClassName");
     InstanceParts parts = partsOf(call);
-    request.properties = parts.properties;
     if (!call.arguments.flag("DeepInheritance", true)) {
-        parts.onlyOf = call.schema.findClass(request.path.className);
+        parts.onlyOf = call.schema.findClass(className);
     }
-    return cursorOf(enumerate(call, std::move(request)), call.form, std::move(parts));
+    Response results = enumerate(call, className, parts.properties);
+    return cursorOf(std::move(results), call.form, std::move(parts));
 }
 
 InstanceParts Operations::partsOf(const Call& call) const {

@@ -122,7 +122,7 @@ private:
 
     Response send(const Call& call, Request request) const;
     void requireProvider(const Call& call, const ObjectPath& path, int code) const;
-    Response enumerate(const Call& call, Request request) const;
+    Response enumerate(const Call& call, const std::string& className, const PropertyList& properties) const;
     Response associate(const Call& call, Request request) const;
     ResultCursor enumeration(const Call& call) const;
     ResultCursor traversal(const Call& call, const ObjectPath& path) const;
