@@ -14,18 +14,25 @@
 #include <system_error>
 
 #include "Files.h"
+#include "cim/DateTime.h"
 
 namespace durable {
 
 namespace {
 
-constexpr struct {
+struct Format {
     const char* fileName;
-    std::string_view newRecord;
-} formats[recordFileCount] = {
-    {"Lease.dat", "\n*\n00000000000000.000000-000\n0\n0\n0\n0\n0\n*\n*\n*\n*\n0\n"},
-    {"Warranty.dat", "\n*\n00000000000000.000000-000\n0\n"},
+    const char* afterDate;  ///< the last lines of a record without values
 };
+
+constexpr Format formats[recordFileCount] = {
+    {"Lease.dat", "0\n0\n0\n0\n0\n*\n*\n*\n*\n0\n"},
+    {"Warranty.dat", "0\n"},
+};
+
+RecordFile fileOf(const std::string& directory, const Format& format) {
+    return {directory, format.fileName, "\n*\n" + std::string(cim::noDate) + "\n" + format.afterDate};
+}
 
 /** The content without the white space at its beginning, which the provider skips. */
 std::string_view withoutLeadingSpace(std::string_view content) {
@@ -53,7 +60,7 @@ std::string timeOf(const std::string& path) {
 
 }  // namespace
 
-RecordFile::RecordFile(const std::string& directory, const char* fileName, std::string_view newRecord)
+RecordFile::RecordFile(const std::string& directory, const char* fileName, const std::string& newRecord)
     : name(fileName),
       file(resolvedPath(directory + name)),
       damaged(file + ".damaged"),
@@ -212,19 +219,19 @@ std::string RecordFile::countsOf(std::string_view content) const {
 
 std::vector<RecordFile> recordFilesIn(const std::string& directory) {
     std::vector<RecordFile> files;
-    for (const auto& each : formats) {
-        files.emplace_back(directory, each.fileName, each.newRecord);
+    for (const Format& each : formats) {
+        files.push_back(fileOf(directory, each));
     }
     return files;
 }
 
 RecordFile recordFileIn(const std::string& directory, std::string_view fileName) {
     const auto* found = std::find_if(std::begin(formats), std::end(formats),
-                                     [&](const auto& each) { return fileName == each.fileName; });
+                                     [&](const Format& each) { return fileName == each.fileName; });
     if (found == std::end(formats)) {
         throw std::invalid_argument(std::string(fileName));
     }
-    return {directory, found->fileName, found->newRecord};
+    return fileOf(directory, *found);
 }
 
 }  // namespace durable

@@ -25,7 +25,7 @@ namespace durable {
 class RecordFile {
 public:
     /** @param newRecord the lines of a record without values, from the end of its identifier */
-    RecordFile(const std::string& directory, const char* fileName, std::string_view newRecord);
+    RecordFile(const std::string& directory, const char* fileName, const std::string& newRecord);
 
     /** The path of the file, or of its target if it is a symbolic link. */
     const std::string& path() const { return file; }
@@ -109,7 +109,7 @@ private:
     std::string file;
     std::string damaged;
     SavedCopies copies;
-    std::string_view endOfNewRecord;
+    std::string endOfNewRecord;
     std::size_t lines;  ///< per record
 };
 
