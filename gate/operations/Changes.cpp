@@ -31,8 +31,7 @@ void requireKnownProperties(const Class& owner, const CMPIInstance* instance) {
         ask<&CMPIInstanceFT::getPropertyAt>(instance, index, &nameString);
         const std::string name = toString(nameString);
         require(!name.empty(), "name a property of the instance");
-        failIf(cim::findNamed(owner, name) == nullptr, CMPI_RC_ERR_NO_SUCH_PROPERTY, owner.name, " has no property ",
-               name, ".");
+        requireProperty(owner, name);
     }
 }
 

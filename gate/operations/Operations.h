@@ -1,5 +1,6 @@
 #pragma once
 
+#include <string_view>
 #include <vector>
 
 #include "gate/session/ProviderSession.h"
@@ -11,6 +12,9 @@
 // session, so that a slow client does not block others. Only a creation returns its path within the session.
 
 namespace gate {
+
+/** Fails with CMPI_RC_ERR_NO_SUCH_PROPERTY unless the class has a property of that name. */
+void requireProperty(const Class& owner, std::string_view name);
 
 /** The properties of a class that a client asks for or sends; without a list, all. Names ignore letter case. */
 class PropertySelection {

@@ -4,6 +4,11 @@
 
 namespace gate {
 
+void requireProperty(const Class& owner, std::string_view name) {
+    failIf(cim::findNamed(owner, name) == nullptr, CMPI_RC_ERR_NO_SUCH_PROPERTY, owner.name, " has no property ", name,
+           ".");
+}
+
 PropertySelection::PropertySelection(const char** list, const Class& itsClass)
     : owner(itsClass), isComplete(list == nullptr) {
     for (const char** name = list; list != nullptr && *name != nullptr; ++name) {
@@ -19,8 +24,7 @@ bool PropertySelection::has(const Property& property) const {
 
 void PropertySelection::requireKnown() const {
     for (const char* name : names) {
-        failIf(cim::findNamed(owner, name) == nullptr, CMPI_RC_ERR_NO_SUCH_PROPERTY, owner.name, " has no property ",
-               name, ".");
+        requireProperty(owner, name);
     }
 }
 
