@@ -2,8 +2,8 @@
 
 #include <filesystem>
 
-#include "agent/TemporaryDirectory.h"
 #include "framework/NodeTree.h"
+#include "support/TemporaryDirectory.h"
 
 using KO::Node;
 using KO::NodeTree;
@@ -20,17 +20,17 @@ class ComputerDiscoveryTest : public testing::Test {
 protected:
     /** Returns the properties of the computer that is discovered with the DMI files written so far. */
     std::map<unsigned int, std::string> computer() {
-        const NodeTree tree = KO::discoverComputer(dmi.path(), "host1", problems);
+        const NodeTree tree = KO::discoverComputer(dmi.withSlash(), "host1", problems);
         EXPECT_EQ(tree.nodes().size(), 2U);
         return tree.nodes().back().properties;
     }
 
-    agent_test::TemporaryDirectory dmi;
+    testsupport::TemporaryDirectory dmi;
     Agent::Problems problems;
 };
 
 TEST_F(ComputerDiscoveryTest, FindsTheSystemAndBelowItTheComputer) {
-    const NodeTree tree = KO::discoverComputer(dmi.path(), "host1", problems);
+    const NodeTree tree = KO::discoverComputer(dmi.withSlash(), "host1", problems);
     ASSERT_EQ(tree.nodes().size(), 2U);
     EXPECT_EQ(tree.nodes()[0].type, 1U);
     EXPECT_EQ(tree.nodes()[0].path, "/system");

@@ -4,7 +4,7 @@
 #include <filesystem>
 
 #include "agent/Probe.h"
-#include "agent/TemporaryDirectory.h"
+#include "support/TemporaryDirectory.h"
 
 using agent_test::ProbeResult;
 using agent_test::runProbe;
@@ -30,7 +30,7 @@ protected:
         return name;
     }
 
-    agent_test::TemporaryDirectory directory;
+    testsupport::TemporaryDirectory directory;
 };
 
 TEST_F(ConfigurationInProcess, MayBeMissing) {

@@ -1,13 +1,13 @@
 #include <gmock/gmock.h>
 
-#include "agent/TemporaryDirectory.h"
 #include "configuration/Document.h"
+#include "support/TemporaryDirectory.h"
 
 using Agent::Document;
 using Agent::Problems;
-using agent_test::TemporaryDirectory;
 using testing::HasSubstr;
 using testing::StartsWith;
+using testsupport::TemporaryDirectory;
 
 namespace {
 
@@ -34,8 +34,8 @@ TEST(Document, IsEmptyWithoutAProblemIfTheFileIsAbsent) {
 
 TEST(Document, IsEmptyWithAProblemIfTheFileCannotBeRead) {
     const TemporaryDirectory directory;
-    const Document document = Document::read(directory.path());
-    EXPECT_EQ(document.problem(), directory.path() + " cannot be read (Is a directory); using the defaults");
+    const Document document = Document::read(directory.withSlash());
+    EXPECT_EQ(document.problem(), directory.withSlash() + " cannot be read (Is a directory); using the defaults");
     EXPECT_EQ(nameIn(document), std::nullopt);
 }
 

@@ -3,12 +3,12 @@
 
 #include <cerrno>
 
-#include "agent/TemporaryDirectory.h"
 #include "configuration/FileContent.h"
+#include "support/TemporaryDirectory.h"
 
 using Agent::FileContent;
 using Agent::readFile;
-using agent_test::TemporaryDirectory;
+using testsupport::TemporaryDirectory;
 
 TEST(FileContent, ReadsACompleteFile) {
     const TemporaryDirectory directory;
@@ -23,7 +23,7 @@ TEST(FileContent, DistinguishesAbsentFromUnreadable) {
     EXPECT_TRUE(readFile(directory.file("nothing")).absent());
     EXPECT_TRUE(readFile(directory.write("file", "") + "/below").absent());
 
-    const FileContent ofDirectory = readFile(directory.path());
+    const FileContent ofDirectory = readFile(directory.withSlash());
     EXPECT_EQ(ofDirectory.error, EISDIR);
     EXPECT_FALSE(ofDirectory.absent());
 }

@@ -7,13 +7,13 @@
 #include "KO/Exceptions.h"
 #include "KO/File.h"
 #include "KO/Strings.h"
-#include "agent/TemporaryDirectory.h"
+#include "support/TemporaryDirectory.h"
 #include "support/Umask.h"
 
-using agent_test::TemporaryDirectory;
 using KO::File;
 using KO::FrameworkException;
 using KO::make_wstring;
+using testsupport::TemporaryDirectory;
 
 namespace {
 
@@ -76,7 +76,8 @@ TEST(File, MustExistToBeOpenedForReading) {
 TEST(File, MustNotBeADirectory) {
     const TemporaryDirectory directory;
     for (const unsigned long mode : {1UL, 3UL}) {
-        EXPECT_EQ(failureOfOpening(directory.path(), mode), "Cannot open " + directory.path() + ": Is a directory");
+        EXPECT_EQ(failureOfOpening(directory.withSlash(), mode),
+                  "Cannot open " + directory.withSlash() + ": Is a directory");
     }
 }
 

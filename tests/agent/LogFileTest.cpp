@@ -5,8 +5,8 @@
 #include <set>
 #include <system_error>
 
-#include "agent/TemporaryDirectory.h"
 #include "logging/Sinks.h"
+#include "support/TemporaryDirectory.h"
 
 using RZLog::LogSettings;
 using testing::ElementsAre;
@@ -31,13 +31,13 @@ protected:
 
     std::set<std::string> files() const {
         std::set<std::string> names;
-        for (const auto& entry : std::filesystem::directory_iterator(directory.path())) {
+        for (const auto& entry : std::filesystem::directory_iterator(directory.withSlash())) {
             names.insert(entry.path().filename());
         }
         return names;
     }
 
-    agent_test::TemporaryDirectory directory;
+    testsupport::TemporaryDirectory directory;
     const std::string large = std::string(3000, 'x');  // two of these exceed the rotation size
 };
 

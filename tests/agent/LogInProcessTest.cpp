@@ -6,7 +6,7 @@
 #include <sstream>
 
 #include "agent/Probe.h"
-#include "agent/TemporaryDirectory.h"
+#include "support/TemporaryDirectory.h"
 
 using agent_test::ProbeResult;
 using agent_test::runProbe;
@@ -39,7 +39,7 @@ protected:
         return all;
     }
 
-    agent_test::TemporaryDirectory directory;
+    testsupport::TemporaryDirectory directory;
 };
 
 const std::string timeFields = R"([0-9]{4}-[0-9]{2}-[0-9]{2}T[0-9:]{8}\.[0-9]{6}[+-][0-9]{2}:[0-9]{2})";
@@ -95,7 +95,7 @@ TEST_F(LogInProcess, ReportsWhetherALevelIsAdmitted) {
 }
 
 TEST_F(LogInProcess, DropsRecordsForAFileThatCannotBeOpened) {
-    run("destination = '" + directory.path() + "'\n", {"log", "3000", "Ostrel.Test", "to a directory"});
+    run("destination = '" + directory.withSlash() + "'\n", {"log", "3000", "Ostrel.Test", "to a directory"});
     run("destination = '/proc/no/such/file'\n", {"log", "3000", "Ostrel.Test", "to nowhere"});
 }
 

@@ -8,7 +8,7 @@
 #include <cstring>
 #include <utility>
 
-#include "agent/TemporaryDirectory.h"
+#include "support/TemporaryDirectory.h"
 
 namespace agent_test {
 
@@ -45,7 +45,7 @@ ProbeResult runProbe(const std::string& configuration, std::vector<std::string> 
 
 ProbeResult runProgram(const std::string& program, const std::string& configuration,
                        std::vector<std::string> arguments) {
-    const TemporaryDirectory directory;
+    const testsupport::TemporaryDirectory directory;
     arguments.insert(arguments.begin(), program);
     std::vector<std::string> variables = environmentWith(configuration);
     posix_spawn_file_actions_t actions;

@@ -5,7 +5,7 @@
 #include "KO/PropertyFile.h"
 #include "KO/Strings.h"
 #include "KO/Utils.h"
-#include "agent/TemporaryDirectory.h"
+#include "support/TemporaryDirectory.h"
 
 using KO::DateTime;
 using KO::FrameworkException;
@@ -25,7 +25,7 @@ protected:
         return status.st_ino;
     }
 
-    agent_test::TemporaryDirectory directory;
+    testsupport::TemporaryDirectory directory;
     PropertyFile file{path(directory.file("asset.dat"))};
 };
 
@@ -144,13 +144,13 @@ TEST_F(PropertyFileTest, CannotBeWrittenWhenOpenedForReading) {
 }
 
 TEST_F(PropertyFileTest, ReportsWhyItCannotBeOpened) {
-    PropertyFile ofDirectory(path(directory.path()));
+    PropertyFile ofDirectory(path(directory.withSlash()));
     for (const unsigned long mode : {1UL, 3UL}) {
         try {
             ofDirectory.open(mode);
             FAIL() << "no exception";
         } catch (const FrameworkException& failure) {
-            EXPECT_EQ(failure.what(), "Cannot open " + directory.path() + ": Is a directory");
+            EXPECT_EQ(failure.what(), "Cannot open " + directory.withSlash() + ": Is a directory");
         }
     }
     EXPECT_THROW(file.open(1), FrameworkException) << "absent";

@@ -12,12 +12,12 @@
 #include <vector>
 
 #include "KO/Exceptions.h"
-#include "agent/TemporaryDirectory.h"
 #include "framework/FileAccess.h"
+#include "support/TemporaryDirectory.h"
 #include "support/Umask.h"
 
-using agent_test::TemporaryDirectory;
 using KO::replaceFile;
+using testsupport::TemporaryDirectory;
 
 namespace {
 
@@ -28,7 +28,7 @@ unsigned int modeOf(const std::string& path) {
 }
 
 std::size_t entriesOf(const TemporaryDirectory& directory) {
-    const std::filesystem::directory_iterator entries(directory.path());
+    const std::filesystem::directory_iterator entries(directory.withSlash());
     return static_cast<std::size_t>(std::distance(begin(entries), end(entries)));
 }
 
@@ -63,7 +63,7 @@ TEST(ReplacementFile, KeepsTheOwner) {
 /** Returns the attributes of a file after an unprivileged user with write access to its directory has replaced it. */
 struct stat statusAfterReplacement(const TemporaryDirectory& directory, const std::vector<gid_t>& groupsOfReplacer) {
     constexpr uid_t otherUser = 65534;
-    EXPECT_EQ(::chown(directory.path().c_str(), otherUser, otherUser), 0);
+    EXPECT_EQ(::chown(directory.withSlash().c_str(), otherUser, otherUser), 0);
     const auto replaceAsOtherUser = [&] {
         if (::setgroups(groupsOfReplacer.size(), groupsOfReplacer.data()) != 0 || ::setgid(otherUser) != 0 ||
             ::setuid(otherUser) != 0) {
@@ -156,7 +156,7 @@ TEST(ReplacementFile, HasADistinctTemporaryName) {
     };
     EXPECT_EXIT(replaceAndBeKilled(), testing::KilledBySignal(SIGXFSZ), "");
     ASSERT_EQ(entriesOf(directory), 1U);
-    const std::string left = std::filesystem::directory_iterator(directory.path())->path().filename();
+    const std::string left = std::filesystem::directory_iterator(directory.withSlash())->path().filename();
     EXPECT_THAT(left, testing::MatchesRegex("\\.asset\\.dat\\.new-......"));
 }
 

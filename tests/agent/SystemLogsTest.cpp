@@ -8,8 +8,8 @@
 #include <ostream>
 #include <vector>
 
-#include "agent/TemporaryDirectory.h"
 #include "logging/Sinks.h"
+#include "support/TemporaryDirectory.h"
 
 using testing::ElementsAre;
 using testing::EndsWith;
@@ -89,7 +89,7 @@ protected:
         return many - taken.size();
     }
 
-    agent_test::TemporaryDirectory directory;
+    testsupport::TemporaryDirectory directory;
     std::string path = directory.file("socket");
     std::optional<Service> service;
 };
@@ -165,7 +165,7 @@ protected:
         return messages.size() == 1 ? messages[0] : "";
     }
 
-    agent_test::TemporaryDirectory directory;
+    testsupport::TemporaryDirectory directory;
 };
 
 TEST_F(SystemLogForm, IsThatOfTheCLibraryForTheSystemLog) {

@@ -2,7 +2,7 @@
 
 #include <memory>
 
-#include "agent/TemporaryDirectory.h"
+#include "support/TemporaryDirectory.h"
 
 namespace agent_test {
 
@@ -42,22 +42,22 @@ path = "/nameless"
 class Configuration : public testing::Environment {
 public:
     void SetUp() override {
-        directory = std::make_unique<TemporaryDirectory>();
-        const std::string directories =
-            "[directories]\ninstall = '" + directory->path() + "install'\ndata = '" + directory->path() + "data/'\n";
+        directory = std::make_unique<testsupport::TemporaryDirectory>();
+        const std::string directories = "[directories]\ninstall = '" + directory->withSlash() + "install'\ndata = '" +
+                                        directory->withSlash() + "data/'\n";
         ::setenv("OSTREL_CONFIG", directory->write("agent.toml", directories + nodes).c_str(), 1);
     }
     void TearDown() override { directory.reset(); }
 
-    std::unique_ptr<TemporaryDirectory> directory;
+    std::unique_ptr<testsupport::TemporaryDirectory> directory;
 };
 
 auto* const configuration = static_cast<Configuration*>(testing::AddGlobalTestEnvironment(new Configuration));
 
 }  // namespace
 
-const std::string& configuredDirectory() {
-    return configuration->directory->path();
+std::string configuredDirectory() {
+    return configuration->directory->withSlash();
 }
 
 }  // namespace agent_test

@@ -5,6 +5,6 @@
 namespace agent_test {
 
 /** Returns the directory with the subdirectories "install" and "data" of this program's agent. */
-const std::string& configuredDirectory();
+std::string configuredDirectory();
 
 }  // namespace agent_test

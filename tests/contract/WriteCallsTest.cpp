@@ -8,7 +8,7 @@
 #include <sstream>
 
 #include "RecordFixture.h"
-#include "support/Files.h"
+#include "support/TemporaryDirectory.h"
 
 // System calls of a rewrite per line of the record file. Records all C library functions that write to or use an open
 // file.
@@ -150,7 +150,7 @@ TEST_P(WriteCallsTest, ARewriteMakesOneWriteCallPerLine) {
 }
 
 TEST(WriteCallsWatchTest, RecordsOtherCallsThanWriting) {
-    const testsupport::TempDirectory directory;
+    const testsupport::TemporaryDirectory directory;
     const std::filesystem::path path = directory.path() / "file";
     const int file = open(path.c_str(), O_RDWR | O_CREAT | O_CLOEXEC, 0600);
     ASSERT_GE(file, 0);

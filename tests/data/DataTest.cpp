@@ -7,6 +7,7 @@
 #include "gate/GateFixture.h"
 #include "support/Command.h"
 #include "support/Files.h"
+#include "support/TemporaryDirectory.h"
 #include "support/UnderTest.h"
 
 // lease-warranty-data with record files that the gate has written.
@@ -63,7 +64,7 @@ protected:
     }
 
     std::string content;  ///< of Lease.dat
-    const testsupport::TempDirectory directory;
+    const testsupport::TemporaryDirectory directory;
     const fs::path document = directory.path() / "document.json";
 };
 

@@ -12,6 +12,7 @@
 #include "LockErrors.h"
 #include "durable/DataDirectory.h"
 #include "support/Files.h"
+#include "support/TemporaryDirectory.h"
 
 namespace durable {
 namespace {
@@ -71,7 +72,7 @@ protected:
         close(end[0]);
     }
 
-    const testsupport::TempDirectory folder;
+    const testsupport::TemporaryDirectory folder;
     static inline std::string path;
     static inline std::vector<std::string> messages;
     DataDirectory directory{[] { return path; }, [](const std::string& message) { messages.push_back(message); }};

@@ -12,6 +12,7 @@
 #include "LockErrors.h"
 #include "durable/DirectoryLock.h"
 #include "support/Files.h"
+#include "support/TemporaryDirectory.h"
 
 namespace durable {
 namespace {
@@ -51,7 +52,7 @@ protected:
         }));
     }
 
-    const testsupport::TempDirectory directory;
+    const testsupport::TemporaryDirectory directory;
     const std::string path = directory.withSlash();
     DirectoryLock held;
 };

@@ -10,6 +10,7 @@
 
 #include "durable/RecordFile.h"
 #include "support/Files.h"
+#include "support/TemporaryDirectory.h"
 
 namespace durable {
 namespace {
@@ -43,7 +44,7 @@ protected:
 
     fs::path in(const char* name) const { return directory.path() / name; }
 
-    const testsupport::TempDirectory directory;
+    const testsupport::TemporaryDirectory directory;
     const RecordFile file = recordFileIn(directory.withSlash(), "Warranty.dat");
     const fs::path path = in("Warranty.dat");
     const fs::path saved = in("Warranty.dat.saved1");  ///< the first copy
@@ -244,7 +245,7 @@ TEST_F(RecordFileTest, IsStoredIfTheFileOrACopyHasContent) {
 }
 
 TEST_F(RecordFileTest, TheTargetOfASymbolicLinkIsProtected) {
-    const testsupport::TempDirectory other;
+    const testsupport::TemporaryDirectory other;
     const fs::path target = other.path() / "records";
     writeFile(target, records({"W1"}));
     fs::create_symlink(target, path);

@@ -12,6 +12,7 @@
 #include "support/Outcome.h"
 #include "support/ProviderLibrary.h"
 #include "support/RecordingBroker.h"
+#include "support/TemporaryDirectory.h"
 
 namespace faults {
 
@@ -96,7 +97,7 @@ public:
     std::filesystem::path configuration() const { return folder.path() / "agent.toml"; }
 
 private:
-    testsupport::TempDirectory folder;
+    testsupport::TemporaryDirectory folder;
     FileContents first;
     testsupport::RecordingBroker broker;
     Library kind;

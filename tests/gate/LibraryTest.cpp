@@ -1,6 +1,7 @@
 #include "GateFixture.h"
 #include "broker/RequestScope.h"
 #include "support/Command.h"
+#include "support/TemporaryDirectory.h"
 #include "support/UnderTest.h"
 
 // The built library file, its factories, loading and unloading.
@@ -37,7 +38,7 @@ TEST_F(LibraryTest, LoadsTheProviderFromItsOwnDirectory) {
 
 TEST_F(LibraryTest, ReportsAMissingProvider) {
     namespace fs = std::filesystem;
-    const testsupport::TempDirectory others;
+    const testsupport::TemporaryDirectory others;
     const fs::path built = gateFile();
     fs::create_directory(others.path() / "cmpi");
     // In an installation, the libraries that the gate is linked with are in the parent directory.

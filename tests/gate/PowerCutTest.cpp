@@ -4,6 +4,7 @@
 #include "SimulatedDisk.h"
 #include "durable/RecordFile.h"
 #include "support/FullDisk.h"
+#include "support/TemporaryDirectory.h"
 
 // Power failures at each sync of a change. A failure between two syncs loses no more than one at the second.
 
@@ -68,7 +69,7 @@ protected:
         disk.eachState([&](const Files& files) { EXPECT_EQ(recovered(files), after) << "acknowledged"; });
     }
 
-    const testsupport::TempDirectory scratch{access("/dev/shm", W_OK) == 0 ? "/dev/shm" : "/tmp"};
+    const testsupport::TemporaryDirectory scratch{access("/dev/shm", W_OK) == 0 ? "/dev/shm" : "/tmp"};
     const char* recordFile = "Lease.dat";
     std::map<Files, std::string> results;
 };

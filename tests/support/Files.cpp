@@ -1,28 +1,10 @@
 #include "support/Files.h"
 
-#include <gtest/gtest.h>
-#include <stdlib.h>
-
 #include <fstream>
 #include <iterator>
 #include <stdexcept>
 
 namespace testsupport {
-
-TempDirectory::TempDirectory() : TempDirectory(std::filesystem::path(testing::TempDir())) {}
-
-TempDirectory::TempDirectory(const std::filesystem::path& parent) {
-    std::string pattern = (parent / "law-XXXXXX").string();
-    if (mkdtemp(pattern.data()) == nullptr) {
-        throw std::runtime_error("cannot create a directory like " + pattern);
-    }
-    directory = pattern;
-}
-
-TempDirectory::~TempDirectory() {
-    std::error_code ignored;
-    std::filesystem::remove_all(directory, ignored);
-}
 
 std::string readFile(const std::filesystem::path& file) {
     std::ifstream stream(file, std::ios::binary);

@@ -3,6 +3,7 @@
 
 #include "host/cli/Program.h"
 #include "host/schema/Schemas.h"
+#include "support/TemporaryDirectory.h"
 
 namespace cimhost::test {
 namespace {
@@ -24,34 +25,34 @@ TEST(Location, ComesFromTheEnvironment) {
 }
 
 TEST(Location, OptionsComeBeforeTheEnvironment) {
-    const TemporaryDirectory directory;
+    const testsupport::TemporaryDirectory directory;
     const std::string other = directory.write("other.mof", "class Other { [Key] string K; };");
     const ProgramResult listed = runBare({"--schema", other, "classes"}, testEnvironment());
     EXPECT_THAT(listed.output, AllOf(StartsWith("Other "), HasSubstr("Test_Box"), HasSubstr("(not in the schema)")));
 }
 
 TEST(Location, ADirectoryMeansItsFilesAndSeveralCanBeNamed) {
-    const TemporaryDirectory directory;
+    const testsupport::TemporaryDirectory directory;
     directory.write("a/2.mof", "class Two : One {};");
     directory.write("a/1.mof", "class One { [Key] string K; };");
     directory.write("a/notes.txt", "no MOF");
     const std::string three = directory.write("3.mof", "class Three : Two {};");
-    const std::string list = "CIMHOST_SCHEMA=" + (directory.path / "a").string() + ":" + three;
-    const std::string registration = "CIMHOST_REGISTRATION=" + directory.write("x.reg", "#").string();
+    const std::string list = "CIMHOST_SCHEMA=" + (directory.path() / "a").string() + ":" + three;
+    const std::string registration = "CIMHOST_REGISTRATION=" + directory.write("x.reg", "#");
     EXPECT_EQ(runBare({"classes"}, {list, registration}).output, "One    -\nTwo    -\nThree  -\n");
     EXPECT_EQ(
-        runBare({"--schema", (directory.path / "a").string(), "--schema", three, "classes"}, {registration}).output,
+        runBare({"--schema", (directory.path() / "a").string(), "--schema", three, "classes"}, {registration}).output,
         "One    -\nTwo    -\nThree  -\n");
 }
 
 TEST(Location, AGateReplacesTheProviderOfItsClassesUnlessTheBareOneIsChosen) {
-    const TemporaryDirectory directory;
+    const testsupport::TemporaryDirectory directory;
     const std::string rest = " location: x\n type: instance\n namespace: root/cimv2\n#\n";
     directory.write("all.reg", "[One]\n provider: Bare\n" + rest + "[Two]\n provider: Bare\n" + rest);
     directory.write("gate/gate.reg", "[one]\n provider: Gate\n" + rest);
-    const std::string schema = directory.write("1.mof", "class One { [Key] string K; }; class Two : One {};").string();
+    const std::string schema = directory.write("1.mof", "class One { [Key] string K; }; class Two : One {};");
     const auto list = [&](std::vector<std::string> options, Environment environment) {
-        environment.push_back("CIMHOST_REGISTRATION=" + directory.path.string());
+        environment.push_back("CIMHOST_REGISTRATION=" + directory.path().string());
         options.insert(options.end(), {"--schema", schema, "classes"});
         return runBare(options, environment);
     };
@@ -100,17 +101,17 @@ INSTANTIATE_TEST_SUITE_P(
         MissingFile{{"ei", "Test_NoFactory"}, "NoSuchProvider_Create_InstanceMI"}));
 
 TEST(CannotLoad, ADirectoryWithoutSuchFilesNamesTheOption) {
-    const TemporaryDirectory directory;
-    const ProgramResult refused = runBare({"--schema", directory.path.string(), "classes"}, testEnvironment());
+    const testsupport::TemporaryDirectory directory;
+    const ProgramResult refused = runBare({"--schema", directory.path().string(), "classes"}, testEnvironment());
     EXPECT_EQ(refused.status, 3);
     EXPECT_THAT(refused.error, AllOf(HasSubstr("no schema"), HasSubstr("--schema"), HasSubstr("CIMHOST_SCHEMA")));
 }
 
 TEST(CannotLoad, ALibraryThatIsNone) {
-    const TemporaryDirectory directory;
+    const testsupport::TemporaryDirectory directory;
     directory.write("libcli_test_provider.so", "this is no library");
     const ProgramResult refused =
-        runBare({"--library-path", directory.path.string(), "ei", "Test_Box"}, testEnvironment());
+        runBare({"--library-path", directory.path().string(), "ei", "Test_Box"}, testEnvironment());
     EXPECT_EQ(refused.status, 3);
     EXPECT_THAT(refused.error, HasSubstr("libcli_test_provider.so"));
 }

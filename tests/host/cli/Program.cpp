@@ -12,6 +12,7 @@
 #include <sstream>
 
 #include "host/schema/Schemas.h"
+#include "support/TemporaryDirectory.h"
 #include "support/UnderTest.h"
 
 namespace cimhost::test {
@@ -57,9 +58,9 @@ void redirect(const std::string& file, int descriptor) {
 
 ProgramResult runBare(const std::vector<std::string>& arguments, const Environment& environment,
                       const std::string& outputFile) {
-    const TemporaryDirectory directory;
-    const std::string output = outputFile.empty() ? (directory.path / "output").string() : outputFile;
-    const std::string error = directory.path / "error";
+    const testsupport::TemporaryDirectory directory;
+    const std::string output = outputFile.empty() ? (directory.path() / "output").string() : outputFile;
+    const std::string error = directory.path() / "error";
     const std::string program = testsupport::underTest(CIMHOST_PROGRAM);
     std::vector<std::string> words = arguments;
     words.insert(words.begin(), program);

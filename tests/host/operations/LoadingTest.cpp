@@ -5,6 +5,7 @@
 #include "OperationsFixture.h"
 #include "operations/RequestRunner.h"
 #include "support/Files.h"
+#include "support/TemporaryDirectory.h"
 
 namespace {
 
@@ -82,7 +83,7 @@ TEST_F(LoadingTest, AMissingLibraryIsALibraryError) {
 }
 
 TEST_F(LoadingTest, AFileThatIsNoLibraryIsALibraryError) {
-    const testsupport::TempDirectory folder;
+    const testsupport::TemporaryDirectory folder;
     const std::string file = folder.withSlash() + "libText.so";
     testsupport::writeFile(file, "no library");
     add("Text", "Text", file.c_str(), true, false);

@@ -1,6 +1,7 @@
 #include <gmock/gmock.h>
 
 #include "host/schema/Schemas.h"
+#include "support/TemporaryDirectory.h"
 
 namespace cimhost::test {
 namespace {
@@ -115,20 +116,20 @@ TEST(MofErrorOfBytes, ANullCharacterIsNoPartOfAString) {
 }
 
 TEST(MofFile, AMissingFileAndADirectoryAreErrors) {
-    const TemporaryDirectory directory;
+    const testsupport::TemporaryDirectory directory;
     Schema schema;
     MofReader reader(schema);
     try {
-        reader.readFile(directory.path / "none.mof");
+        reader.readFile(directory.path() / "none.mof");
         FAIL() << "there is no such file";
     } catch (const LoadError& error) {
         EXPECT_THAT(error.what(), EndsWith("none.mof: this file does not exist"));
     }
-    EXPECT_THROW(reader.readFile(directory.path), LoadError);
+    EXPECT_THROW(reader.readFile(directory.path()), LoadError);
 }
 
 TEST(MofFile, AnErrorInAnIncludedFileNamesThatFile) {
-    const TemporaryDirectory directory;
+    const testsupport::TemporaryDirectory directory;
     const auto bad = directory.write("bad.mof", "class {};");
     const auto top = directory.write("top.mof", "#pragma include (\"bad.mof\")");
     Schema schema;
@@ -136,12 +137,12 @@ TEST(MofFile, AnErrorInAnIncludedFileNamesThatFile) {
         MofReader(schema).readFile(top);
         FAIL() << "the file was taken";
     } catch (const LoadError& error) {
-        EXPECT_THAT(error.what(), StartsWith(bad.string() + ":1:7: expected a class name"));
+        EXPECT_THAT(error.what(), StartsWith(bad + ":1:7: expected a class name"));
     }
 }
 
 TEST(MofFile, AnEmptyFileIsGood) {
-    const TemporaryDirectory directory;
+    const testsupport::TemporaryDirectory directory;
     Schema schema;
     MofReader(schema).readFile(directory.write("empty.mof", ""));
     EXPECT_TRUE(schema.classes().empty());

@@ -1,6 +1,7 @@
 #include <gtest/gtest.h>
 
 #include "host/schema/Schemas.h"
+#include "support/TemporaryDirectory.h"
 
 namespace cimhost::test {
 namespace {
@@ -168,7 +169,7 @@ TEST(MofReader, OtherPragmasAreIgnored) {
 }
 
 TEST(MofReader, IncludesAreRelativeToTheFileThatIncludes) {
-    const TemporaryDirectory directory;
+    const testsupport::TemporaryDirectory directory;
     directory.write("sub/base.mof", "class Base { [Key] string Name; };");
     directory.write("sub/all.mof", "#pragma include (\"base.mof\")\nclass Derived : Base {};");
     const auto top = directory.write("top.mof", "#pragma include (\"sub/all.mof\")\nclass Top : Derived {};");
@@ -178,7 +179,7 @@ TEST(MofReader, IncludesAreRelativeToTheFileThatIncludes) {
 }
 
 TEST(MofReader, AFileIsReadOnceHoweverOftenItIsNamed) {
-    const TemporaryDirectory directory;
+    const testsupport::TemporaryDirectory directory;
     const auto base = directory.write("base.mof", "#pragma include (\"base.mof\")\nclass Base {};");
     const auto top = directory.write("top.mof", "#pragma include (\"base.mof\")\n#pragma include (\"./base.mof\")\n");
     Schema schema;

@@ -4,6 +4,7 @@
 
 #include "host/schema/Schemas.h"
 #include "schema/Registration.h"
+#include "support/TemporaryDirectory.h"
 
 namespace cimhost::test {
 namespace {
@@ -100,22 +101,22 @@ TEST(RegistrationError, AStanzaMustSayWhichProviderInWhichLibraryServesWhichName
 }
 
 TEST(RegistrationFile, IsReadWithThePositionOfEachSection) {
-    const TemporaryDirectory directory;
+    const testsupport::TemporaryDirectory directory;
     const auto file = directory.write("one.reg", "#\n[One]\nprovider: P\nlocation: L\nnamespace: n\n");
     const auto stanzas = readRegistrationFile(file);
     ASSERT_EQ(stanzas.size(), 1U);
-    EXPECT_EQ(stanzas[0].source, file.string() + ":2");
+    EXPECT_EQ(stanzas[0].source, file + ":2");
 }
 
 TEST(RegistrationFile, ThatIsMissingOrADirectoryIsAnError) {
-    const TemporaryDirectory directory;
+    const testsupport::TemporaryDirectory directory;
     try {
-        readRegistrationFile(directory.path / "none.reg");
+        readRegistrationFile(directory.path() / "none.reg");
         FAIL() << "there is no such file";
     } catch (const LoadError& error) {
         EXPECT_THAT(error.what(), EndsWith("none.reg: this file does not exist"));
     }
-    EXPECT_THROW(readRegistrationFile(directory.path), LoadError);
+    EXPECT_THROW(readRegistrationFile(directory.path()), LoadError);
 }
 
 }  // namespace

@@ -42,24 +42,4 @@ Element element(const Value& value) {
     return std::get<Element>(value.single);
 }
 
-/** A temporary directory, which the destructor removes. */
-class TemporaryDirectory {
-public:
-    TemporaryDirectory() {
-        std::string name = testing::TempDir() + "cimhost-XXXXXX";
-        path = mkdtemp(name.data());
-    }
-    ~TemporaryDirectory() { std::filesystem::remove_all(path); }
-    TemporaryDirectory(const TemporaryDirectory&) = delete;
-    TemporaryDirectory& operator=(const TemporaryDirectory&) = delete;
-
-    std::filesystem::path write(const std::string& name, const std::string& text) const {
-        std::filesystem::create_directories((path / name).parent_path());
-        std::ofstream(path / name) << text;
-        return path / name;
-    }
-
-    std::filesystem::path path{};
-};
-
 }  // namespace cimhost::test

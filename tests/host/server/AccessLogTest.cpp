@@ -5,6 +5,7 @@
 
 #include "server/AccessLog.h"
 #include "support/Files.h"
+#include "support/TemporaryDirectory.h"
 
 using namespace cimhost::server;
 
@@ -28,7 +29,7 @@ TEST(AccessLogTest, ClientsCannotForgeLines) {
 }
 
 TEST(AccessLogTest, ReopeningFollowsARotation) {
-    const testsupport::TempDirectory directory;
+    const testsupport::TemporaryDirectory directory;
     const std::string file = directory.withSlash() + "access.log";
     AccessLog log(file);
     log.write("first");

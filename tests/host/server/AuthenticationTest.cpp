@@ -9,7 +9,7 @@
 
 #include "server/Authentication.h"
 #include "server/UserDatabase.h"
-#include "support/Files.h"
+#include "support/TemporaryDirectory.h"
 
 using namespace cimhost::server;
 
@@ -45,7 +45,7 @@ protected:
             << "auth required pam_permit.so\naccount required pam_deny.so\n";
     }
 
-    testsupport::TempDirectory directory;
+    testsupport::TemporaryDirectory directory;
     const std::string client = "192.0.2.7";
 };
 

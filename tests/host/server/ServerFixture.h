@@ -10,7 +10,7 @@
 
 #include "schema/MofReader.h"
 #include "server/RequestHandler.h"
-#include "support/Files.h"
+#include "support/TemporaryDirectory.h"
 
 namespace cimhost::server::test {
 
@@ -103,7 +103,7 @@ protected:
     const std::string wrong = "d3JpdGVyOndyb25n";         // writer:wrong
     const std::string stranger = "c3RyYW5nZXI6cmlnaHQ=";  // stranger:right
 
-    testsupport::TempDirectory directory;
+    testsupport::TemporaryDirectory directory;
     Schema schema;
     ProviderRegistry registry;
     FakeManager manager;

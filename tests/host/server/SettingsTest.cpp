@@ -7,7 +7,7 @@
 #include <utility>
 
 #include "server/Settings.h"
-#include "support/Files.h"
+#include "support/TemporaryDirectory.h"
 
 using namespace cimhost::server;
 using testing::ElementsAre;
@@ -31,7 +31,7 @@ protected:
         return "accepted";
     }
 
-    testsupport::TempDirectory directory;
+    testsupport::TemporaryDirectory directory;
     const std::string file = directory.withSlash() + "cimhost.toml";
 };
 
