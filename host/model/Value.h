@@ -70,7 +70,11 @@ class ArrayElements {
 public:
     ArrayElements() = default;
     ArrayElements(std::vector<Scalar> initial) : elements(std::make_unique<std::vector<Scalar>>(std::move(initial))) {}
-    ArrayElements(const ArrayElements& other) : elements(other.copy()) {}
+    ArrayElements(const ArrayElements& other) {
+        if (other.elements != nullptr) {
+            elements = std::make_unique<std::vector<Scalar>>(*other.elements);
+        }
+    }
     ArrayElements(ArrayElements&&) noexcept = default;
     ArrayElements& operator=(ArrayElements other) noexcept {
         elements = std::move(other.elements);
@@ -82,10 +86,6 @@ public:
     }
 
 private:
-    std::unique_ptr<std::vector<Scalar>> copy() const {
-        return elements == nullptr ? nullptr : std::make_unique<std::vector<Scalar>>(*elements);
-    }
-
     std::unique_ptr<std::vector<Scalar>> elements{};  ///< null: none
 };
 
