@@ -27,6 +27,7 @@ const Class& classOf(const ObjectPath& path, const Schema& schema) {
 template <class Elements>
 std::vector<std::string> namesOf(const Elements& elements) {
     std::vector<std::string> names;
+    names.reserve(elements.size());
     for (const auto& each : elements) {
         names.push_back(each.name);
     }

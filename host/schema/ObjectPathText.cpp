@@ -63,7 +63,7 @@ void addKey(ObjectPath& result, const Node& node, const Class* known, const Sche
         throw PathError("key " + name + " is given twice");
     }
     const Literal literal = readKeyValue(*findChild<path::KeyValue>(node));
-    result.keys.push_back({name, keyValue(literal, name, findKey(known, name), schema, defaultNameSpace)});
+    result.keys.emplace_back(name, keyValue(literal, name, findKey(known, name), schema, defaultNameSpace));
 }
 
 ObjectPath buildPath(const Node& root, const Schema& schema, const std::string& defaultNameSpace) {
