@@ -139,7 +139,7 @@ public:
     /** Ends the oldest connection with a client that does not receive its response, if there is one. */
     void endStalledResponse();
 
-    /** Ends all connections, also those that are added later; those at work end when the operation has ended. */
+    /** Ends all connections, also those that are added later; those with a running request end after it. */
     void endAll();
 
 private:

@@ -8,7 +8,7 @@
 
 namespace cimhost::server {
 
-/** Limits an amount that requests share, such as the number of requests at work. */
+/** Limits an amount that requests share, such as the number of running requests. */
 class Quota {
 public:
     explicit Quota(std::size_t itsLimit) : limit(itsLimit) {}
@@ -23,7 +23,7 @@ public:
         Share(const Share&) = delete;
         Share& operator=(const Share&) = delete;
 
-        /** Waits until one is available, and takes it. @return false if it is not available in time */
+        /** Waits until a share of one is available, and takes it. @return false if it is not available in time */
         bool take(Quota& from, Time latest) {
             if (from.acquire(latest)) {
                 quota = &from;

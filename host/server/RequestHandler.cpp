@@ -31,8 +31,8 @@ RequestHandler::RequestHandler(const Settings& itsSettings, cimxml::Operations& 
       operations(itsOperations),
       authenticator(itsAuthenticator),
       accessLog(itsLog),
-      requests(itsSettings.limits.requestsAtWork),
-      lists(itsSettings.limits.listsAtWork),
+      requests(itsSettings.limits.runningRequests),
+      lists(itsSettings.limits.runningLists),
       results(itsSettings.limits.responseResults) {}
 
 std::optional<HttpResponse> RequestHandler::begin(Exchange& exchange, const HttpRequest& request) {
@@ -144,24 +144,24 @@ Reply RequestHandler::answer(Exchange& exchange) {
 }
 
 /**
- * Lists have other places than short requests, which otherwise would wait for their results. While it waits for the
- * results of others, a list keeps its place.
+ * Lists have another quota than short requests, which otherwise would wait for their results. While it waits for the
+ * results of others, a list keeps its share.
  */
 Reply RequestHandler::performWhenFree(Exchange& exchange) {
     const auto latest = std::chrono::steady_clock::now() + settings.limits.queueTime;
     const bool returnsList = cimxml::Operations::returnsList(exchange.headers.method);
-    Quota::Share place;
-    if (!place.take(returnsList ? lists : requests, latest)) {
+    Quota::Share share;
+    if (!share.take(returnsList ? lists : requests, latest)) {
         return unavailable("The server has too many requests.");
     }
     if (returnsList && !exchange.unfinished.take(results, latest)) {
         return unavailable("Other clients have not received their results yet.");
     }
-    return perform(exchange, place);
+    return perform(exchange, share);
 }
 
-/** Leaves the place before it writes: while a thread writes, another can perform its request. */
-Reply RequestHandler::perform(Exchange& exchange, Quota::Share& place) {
+/** Releases the share before it writes: while a thread writes, another can perform its request. */
+Reply RequestHandler::perform(Exchange& exchange, Quota::Share& share) {
     cimxml::XmlLimits limits;
     limits.depth = settings.limits.xmlDepth;
     limits.elements = settings.limits.xmlElements;
@@ -174,7 +174,7 @@ Reply RequestHandler::perform(Exchange& exchange, Quota::Share& place) {
     const auto text = std::make_shared<cimxml::ResponseText>(respond(exchange, message));
     exchange.record.objects = text->count();
     exchange.unfinished.resize(text->count());
-    place.resize(0);
+    share.resize(0);
     CimReply reply{text};
     reply.isComplete = !text->append(reply.beginning, blockSize);
     if (reply.isComplete) {

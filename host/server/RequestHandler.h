@@ -75,7 +75,7 @@ public:
     void logIncomplete(Exchange& exchange) const;
     void logIncomplete(const Connection& connection) const;
 
-    /** Whether no request is at work. */
+    /** Whether no request is running. */
     bool isIdle() const { return requests.isUnused() && lists.isUnused(); }
 
     /** Whether a response waits until clients have received others. */
@@ -94,7 +94,7 @@ private:
     std::optional<Right> verified(Exchange& exchange, const std::string& authorization);
     Reply answer(Exchange& exchange);
     Reply performWhenFree(Exchange& exchange);
-    Reply perform(Exchange& exchange, Quota::Share& place);
+    Reply perform(Exchange& exchange, Quota::Share& share);
     cimxml::ResponseText respond(Exchange& exchange, const cimxml::Message& message);
 
     const Settings& settings;
@@ -102,8 +102,8 @@ private:
     Authenticator& authenticator;
     PasswordQueue passwords;  ///< for calls of the authenticator
     const AccessLog& accessLog;
-    Quota requests;  ///< at work, except for lists
-    Quota lists;     ///< at work
+    Quota requests;  ///< running, except for lists
+    Quota lists;     ///< running
     Quota results;   ///< of unfinished responses
     std::atomic<bool> stopping{false};
 };

@@ -32,8 +32,8 @@ struct AccessRules {
 struct Limits {
     std::size_t connections = 256;
     std::size_t connectionsPerAddress = 192;  ///< of one network, see networkOf()
-    std::size_t listsAtWork = 4;              ///< requests that return lists
-    std::size_t requestsAtWork = 1;           ///< other requests
+    std::size_t runningLists = 4;             ///< requests that return lists
+    std::size_t runningRequests = 1;          ///< other requests
     std::chrono::seconds queueTime{30};       ///< time that a request waits for running requests
     std::size_t responseResults = 200'000;    ///< of all responses that clients have not received completely
     std::size_t requestBytes = std::size_t{4} << 20U;

@@ -256,7 +256,7 @@ TEST_F(HttpServerTest, IdleConnectionsEnd) {
 }
 
 TEST_F(HttpServerTest, ARequestThatWaitsTooLongForOthersIsRefused) {
-    settings.limits.listsAtWork = 1;
+    settings.limits.runningLists = 1;
     settings.limits.queueTime = 0s;
     OtherOperation other(*this);
     const Socket client = connect();
@@ -287,8 +287,8 @@ TEST_F(HttpServerTest, APasswordThatWaitsTooLongForOthersIsNotChecked) {
     EXPECT_THAT(first.receiveUntil("</CIM>\n"), StartsWith("HTTP/1.1 200 "));
 }
 
-TEST_F(HttpServerTest, ARequestWaitsForOthersAtWork) {
-    settings.limits.listsAtWork = 1;
+TEST_F(HttpServerTest, ARequestWaitsForRunningOnes) {
+    settings.limits.runningLists = 1;
     settings.limits.queueTime = 1h;
     OtherOperation other(*this);
     const Socket client = connect();

@@ -177,8 +177,8 @@ TEST_F(RequestHandlerTest, BodiesThatAreTooLargeAreIgnoredUpToALimit) {
     EXPECT_EQ(status(head("EnumerateInstanceNames", reader), std::string(8001, ' ')), "ended");
 }
 
-TEST_F(RequestHandlerTest, ListsAndOtherRequestsAtWorkAreLimited) {
-    settings.limits.listsAtWork = 1;
+TEST_F(RequestHandlerTest, RunningListsAndOtherRequestsAreLimited) {
+    settings.limits.runningLists = 1;
     settings.limits.queueTime = std::chrono::seconds(0);
     std::vector<std::string> during;
     manager.answerWith([&](const Request& request) {
@@ -192,7 +192,7 @@ TEST_F(RequestHandlerTest, ListsAndOtherRequestsAtWorkAreLimited) {
 }
 
 TEST_F(RequestHandlerTest, PasswordsAndRequestsWaitForOthersBeforeTheyAreRefused) {
-    settings.limits.listsAtWork = 1;
+    settings.limits.runningLists = 1;
     settings.limits.queueTime = std::chrono::seconds(1);
     const auto waitInVain = [&] {
         const auto start = std::chrono::steady_clock::now();
@@ -236,7 +236,7 @@ TEST_F(RequestHandlerTest, ShortRequestsDoNotWaitForListsThatOthersReceive) {
 }
 
 TEST_F(RequestHandlerTest, AsManyListsAsConfiguredRunAtTheSameTime) {
-    settings.limits.listsAtWork = 2;
+    settings.limits.runningLists = 2;
     settings.limits.queueTime = std::chrono::seconds(0);
     std::vector<std::string> inner;
     manager.answerWith([&, depth = std::make_shared<int>(0)](const Request&) {
