@@ -28,30 +28,30 @@ const CMPIInstance* firstOf(const Instances& instances) {
     return instances.empty() ? nullptr : instances.front();
 }
 
-/** The provider's answer to a request. Its objects belong to the object manager, which frees them with the request. */
-struct ProviderAnswer {
+/** The provider's response to a request. Its objects belong to the object manager, which frees them after it. */
+struct ProviderResponse {
     Instances instances{};
     Paths paths{};
     bool isDone = false;  ///< whether the provider called returnDone
 };
 
-/** Adds an object to one of the lists of the answer. */
+/** Adds an object to one of the lists of the response. */
 template <auto list, class Object>
 CMPIStatus collect(const CMPIResult* result, Object* object) {
-    (static_cast<ProviderAnswer*>(result->hdl)->*list).push_back(object);
+    (static_cast<ProviderResponse*>(result->hdl)->*list).push_back(object);
     return {CMPI_RC_OK, nullptr};
 }
 
-/** The functions that the provider calls, of a CMPI result that collects its answer to be checked. */
+/** The functions that the provider calls, of a CMPI result that collects its response to be checked. */
 CMPIResultFT collectorFunctions{
     CMPIVersion200,
     nullptr,
     nullptr,
     nullptr,
-    collect<&ProviderAnswer::instances>,
-    collect<&ProviderAnswer::paths>,
+    collect<&ProviderResponse::instances>,
+    collect<&ProviderResponse::paths>,
     [](const CMPIResult* result) {
-        static_cast<ProviderAnswer*>(result->hdl)->isDone = true;
+        static_cast<ProviderResponse*>(result->hdl)->isDone = true;
         return CMPIStatus{CMPI_RC_OK, nullptr};
     },
     nullptr,
@@ -59,10 +59,10 @@ CMPIResultFT collectorFunctions{
 
 /** Calls a function of one of the provider's interfaces. */
 template <auto function, class... Arguments>
-ProviderAnswer call(const ClientRequest& request, const LocalObject& path, Arguments... arguments) {
+ProviderResponse call(const ClientRequest& request, const LocalObject& path, Arguments... arguments) {
     auto* const interface = theConnection.provider().interfaceWith(function);
-    ProviderAnswer answer;
-    const CMPIResult result{&answer, &collectorFunctions};
+    ProviderResponse response;
+    const CMPIResult result{&response, &collectorFunctions};
     theConnection.wrappedBroker().hasFailed = false;
     const CMPIStatus status =
         (interface->ft->*function)(interface, request.context, &result, path.path(), arguments...);
@@ -71,16 +71,16 @@ ProviderAnswer call(const ClientRequest& request, const LocalObject& path, Argum
         fail(status.rc, reason.empty() ? "The provider returned code " + std::to_string(status.rc) + "." : reason);
     }
     request.requireManager();
-    return answer;
+    return response;
 }
 
-/** The same for a function that ends its answer and omits objects that the provider cannot create. */
+/** The same for a function that ends its response and omits objects that the provider cannot create. */
 template <auto function, class... Arguments>
-ProviderAnswer read(const ClientRequest& request, const LocalObject& path, Arguments... arguments) {
-    ProviderAnswer answer = call<function>(request, path, arguments...);
+ProviderResponse read(const ClientRequest& request, const LocalObject& path, Arguments... arguments) {
+    ProviderResponse response = call<function>(request, path, arguments...);
     require(!theConnection.wrappedBroker().hasFailed, "create the paths and instances of the answer");
-    requireFinished(answer.isDone);
-    return answer;
+    requireFinished(response.isDone);
+    return response;
 }
 
 }  // namespace
@@ -155,7 +155,7 @@ Instances ProviderSession::associators(const LocalObject& computer, const Class&
 
 const CMPIInstance* ProviderSession::find(const LocalObject& keys, const Class& owner) const {
     if (sameName(owner.name, agentClass)) {
-        // A get does not end its answer for other keys than the only instance's, as after an error.
+        // A get does not end its response for other keys than the only instance's, as after an error.
         const CMPIInstance* agent = firstOf(instances(owner));
         return agent != nullptr && samePath(pathOf(agent), keys.path()) ? agent : nullptr;
     }

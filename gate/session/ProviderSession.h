@@ -48,8 +48,8 @@ struct ClientRequest {
  * An object manager may crash while a client's object is read: SFCB does for a string that was sent as an integer.
  * Begin the session before you read a client's keys and values: then no data file is being written.
  *
- * The provider logs its errors and returns success. An answer that was not ended, or has another number of records than
- * the file, is a Failure here; the caller has to check the result of a change.
+ * The provider logs its errors and returns success. A response that was not ended, or has another number of records
+ * than the file, is a Failure here; the caller has to check the result of a change.
  */
 class ProviderSession {
 public:
