@@ -108,7 +108,7 @@ struct ResultWriter {
 
     CMPIStatus returnPath(const Computer& computer) const {
         const CMPIObjectPath* path = makePath(computer);
-        return path != nullptr ? result->ft->returnObjectPath(result, path) : cannotMake();
+        return path != nullptr ? cim::tell<&CMPIResultFT::returnObjectPath>(result, path) : cannotMake();
     }
 
     /** @param wanted names of properties in any letter case, ended by null; null for all. The key is always returned.
@@ -124,10 +124,10 @@ struct ResultWriter {
                 ProviderUtilities::setProperty(instance, property.name, *value);
             }
         }
-        return result->ft->returnInstance(result, instance);
+        return cim::tell<&CMPIResultFT::returnInstance>(result, instance);
     }
 
-    CMPIStatus done() const { return result->ft->returnDone(result); }
+    CMPIStatus done() const { return cim::tell<&CMPIResultFT::returnDone>(result); }
 
 private:
     CMPIObjectPath* makePath(const Computer& computer) const {

@@ -27,7 +27,7 @@ def run(*arguments):
 
 
 def query(*arguments):
-    """The parsed answer of a request that reads."""
+    """The parsed response to a request that reads."""
     output, status, message = run("--format", "json", *arguments)
     if status != 0:
         raise Unreadable(message or f"cimhost ended with status {status}.")

@@ -85,9 +85,9 @@ std::optional<std::string> propertyOf(const CMPIInstance* instance, const Proper
 
 /** Returns the values of the wanted properties, except those without a value. */
 template <class IsWanted>
-Values valuesOf(const CMPIInstance* instance, const Class& owner, IsWanted isWanted) {
+Values valuesOf(const CMPIInstance* instance, const Class& requested, IsWanted isWanted) {
     Values values;
-    for (const Property& property : owner) {
+    for (const Property& property : requested) {
         if (const auto value = isWanted(property) ? propertyOf(instance, property) : std::nullopt) {
             values.emplace_back(&property, *value);
         }

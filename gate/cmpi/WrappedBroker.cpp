@@ -23,14 +23,14 @@ private:
 template <auto slot, class Table, class Result, class... Arguments>
 Result forward(const CMPIBroker* broker, Arguments... arguments) {
     constexpr bool isService = std::is_same_v<Table, CMPIBrokerFT>;
-    constexpr bool makesAnswers = std::is_same_v<Result, CMPIInstance*> || std::is_same_v<Result, CMPIObjectPath*>;
+    constexpr bool makesResults = std::is_same_v<Result, CMPIInstance*> || std::is_same_v<Result, CMPIObjectPath*>;
     auto& wrapper = *static_cast<WrappedBroker*>(broker->hdl);
     const CMPIBroker* manager = wrapper.manager;
     const auto function = std::get<Table*>(std::tuple(manager->bft, manager->eft, manager->mft))->*slot;
     if constexpr (isService) {
         const ScopedRelease scopedRelease(wrapper.lock);
         return function(manager, arguments...);
-    } else if constexpr (makesAnswers) {
+    } else if constexpr (makesResults) {
         const Result made = function(manager, arguments...);
         const CMPIStatus* status = std::get<sizeof...(Arguments) - 1>(std::tie(arguments...));
         wrapper.hasFailed = wrapper.hasFailed || made == nullptr || (status != nullptr && status->rc != CMPI_RC_OK);

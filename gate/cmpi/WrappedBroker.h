@@ -29,7 +29,7 @@ public:
     const CMPIBroker* const manager;  ///< the object manager's broker
     const Lock lock;
 
-    /** Whether a path or instance could not be created. The provider omits such answers without an error. */
+    /** Whether a path or instance could not be created. The provider omits such objects without an error. */
     bool hasFailed = false;
 
 private:

@@ -192,26 +192,26 @@ Traversals traversalsFrom(const ClientRequest& request, const char* associationC
 }
 
 /** Returns what `make(request, pair)` makes of each pair of the traversals, in one session. */
-template <class Answers, class Make>
-Answers traverse(const ClientRequest& request, const Traversals& traversals, Make make) {
-    Answers answers;
+template <class Results, class Make>
+Results traverse(const ClientRequest& request, const Traversals& traversals, Make make) {
+    Results results;
     if (!traversals.empty()) {
         ProviderSession session(request);
         for (const AssociationPair& pair : pairsOf(request, session, traversals)) {
-            answers.push_back(make(request, pair));
+            results.push_back(make(request, pair));
         }
     }
-    return answers;
+    return results;
 }
 
-/** Returns the answers that are of the result class to the client. */
-template <class Answers, class PathOf>
-void giveOfClass(const ClientRequest& request, const char* resultClass, Answers answers, PathOf pathOfAnswer) {
-    const auto isOther = [&](const auto* answer) {
-        return !isAny(resultClass) && !isA(request, pathOfAnswer(answer), resultClass);
+/** Returns the results that are of the result class to the client. */
+template <class Results, class PathOf>
+void returnOfClass(const ClientRequest& request, const char* resultClass, Results results, PathOf pathOfResult) {
+    const auto isOther = [&](const auto* result) {
+        return !isAny(resultClass) && !isA(request, pathOfResult(result), resultClass);
     };
-    answers.erase(std::remove_if(answers.begin(), answers.end(), isOther), answers.end());
-    request.give(answers);
+    results.erase(std::remove_if(results.begin(), results.end(), isOther), results.end());
+    request.returnResults(results);
 }
 
 CMPIValue referenceTo(const CMPIObjectPath* target) {
@@ -250,7 +250,7 @@ void associators(const ClientRequest& request, const char* associationClass, con
         return selection.applied(request.broker(), at(target, pair).instance);
     };
     const auto traversals = traversalsFrom(request, associationClass, role, resultRole, ElementForm::instance);
-    giveOfClass(request, resultClass, traverse<Instances>(request, traversals, instanceAt), pathOf);
+    returnOfClass(request, resultClass, traverse<Instances>(request, traversals, instanceAt), pathOf);
 }
 
 void associatorNames(const ClientRequest& request, const char* associationClass, const char* resultClass,
@@ -259,18 +259,18 @@ void associatorNames(const ClientRequest& request, const char* associationClass,
         return at(*pair.traversal.target, pair).path;
     };
     const Traversals traversals = traversalsFrom(request, associationClass, role, resultRole);
-    giveOfClass(request, resultClass, traverse<Paths>(request, traversals, targetOf),
-                [](const CMPIObjectPath* path) { return path; });
+    returnOfClass(request, resultClass, traverse<Paths>(request, traversals, targetOf),
+                  [](const CMPIObjectPath* path) { return path; });
 }
 
 void references(const ClientRequest& request, const char* associationClass, const char* role, const char**) {
     const Traversals traversals = traversalsFrom(request, associationClass, role, nullptr);
-    request.give(traverse<Instances>(request, traversals, associationInstance));
+    request.returnResults(traverse<Instances>(request, traversals, associationInstance));
 }
 
 void referenceNames(const ClientRequest& request, const char* associationClass, const char* role) {
     const Traversals traversals = traversalsFrom(request, associationClass, role, nullptr);
-    request.give(traverse<Paths>(request, traversals, associationPath));
+    request.returnResults(traverse<Paths>(request, traversals, associationPath));
 }
 
 Instances associationInstances(const ClientRequest& request, const Class& association) {

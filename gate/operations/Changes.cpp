@@ -9,38 +9,38 @@ namespace {
  * The class's file. Fails with CMPI_RC_ERR_NOT_SUPPORTED if its instances cannot be changed that way.
  * @param hasRecords whether it must be a record file, for creations and deletions
  */
-const DataFile& fileOf(const Class& owner, bool hasRecords, const char* changed) {
-    const DataFile* file = dataFileOf(owner);
-    failIf(file == nullptr || (hasRecords && !file->hasRecords), CMPI_RC_ERR_NOT_SUPPORTED, "Instances of ", owner.name,
-           changed);
+const DataFile& fileOf(const Class& requested, bool hasRecords, const char* changed) {
+    const DataFile* file = dataFileOf(requested);
+    failIf(file == nullptr || (hasRecords && !file->hasRecords), CMPI_RC_ERR_NOT_SUPPORTED, "Instances of ",
+           requested.name, changed);
     return *file;
 }
 
-const DataFile& recordFileOf(const Class& owner) {
-    return fileOf(owner, true, " can be neither created nor deleted.");
+const DataFile& recordFileOf(const Class& requested) {
+    return fileOf(requested, true, " can be neither created nor deleted.");
 }
 
 void requireInstance(const CMPIInstance* instance) {
     failIf(instance == nullptr, CMPI_RC_ERR_INVALID_PARAMETER, "The request has no instance.");
 }
 
-void requireKnownProperties(const Class& owner, const CMPIInstance* instance) {
+void requireKnownProperties(const Class& requested, const CMPIInstance* instance) {
     const CMPICount count = demand<&CMPIInstanceFT::getPropertyCount>("count the properties of the instance", instance);
     for (CMPICount index = 0; index < count; ++index) {
         CMPIString* nameString = nullptr;
         ask<&CMPIInstanceFT::getPropertyAt>(instance, index, &nameString);
         const std::string name = toString(nameString);
         require(!name.empty(), "name a property of the instance");
-        requireProperty(owner, name);
+        requireProperty(requested, name);
     }
 }
 
 /** The identifier of a new record: from the path or, if that has none, from the instance. */
 std::string identifierOf(const CMPIObjectPath* path, const CMPIInstance* instance, const Property& key,
-                         const Class& owner) {
+                         const Class& requested) {
     std::string fromPath = keyOf(path, key.name, key.type).value_or(std::string());
     std::string fromInstance = propertyOf(instance, key).value_or(std::string());
-    failIf(fromPath.empty() && fromInstance.empty(), CMPI_RC_ERR_INVALID_PARAMETER, "A new ", owner.name,
+    failIf(fromPath.empty() && fromInstance.empty(), CMPI_RC_ERR_INVALID_PARAMETER, "A new ", requested.name,
            " needs a value of its key ", key.name, ", in the path or in the instance.");
     return fromPath.empty() ? fromInstance : fromPath;
 }
@@ -60,9 +60,9 @@ void createInstance(const ClientRequest& request, const CMPIInstance* instance) 
     CMPIObjectPath* created = makePath(request.broker(), nameSpace, requested.name);
     // In CMPI, the pointer to a value of type CMPI_chars is the pointer to its characters.
     addKey(created, key.name, reinterpret_cast<const CMPIValue*>(identifier.c_str()), CMPI_chars);
-    const Paths answer{created};
+    const Paths results{created};
     const LocalObject path(nameSpace, requested, {{&key, identifier}});
-    Transaction(session, requested, file, path).create(identifier, given, [&] { request.give(answer); });
+    Transaction(session, requested, file, path).create(identifier, given, [&] { request.returnResults(results); });
 }
 
 void modifyInstance(const ClientRequest& request, const CMPIInstance* instance, const char** properties) {

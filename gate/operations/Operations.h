@@ -5,16 +5,16 @@
 
 #include "gate/session/ProviderSession.h"
 
-// The operations of CIM, and their property lists. Each returns its answers through the request's result, or throws
+// The operations of CIM, and their property lists. Each returns its results through the request's result, or throws
 // Failure or ManagerGone.
 //
-// An operation begins its session before it reads a client's keys and values, and returns its answers after the
+// An operation begins its session before it reads a client's keys and values, and returns its results after the
 // session, so that a slow client does not block others. Only a creation returns its path within the session.
 
 namespace gate {
 
 /** Fails with CMPI_RC_ERR_NO_SUCH_PROPERTY unless the class has a property of that name. */
-void requireProperty(const Class& owner, std::string_view name);
+void requireProperty(const Class& requested, std::string_view name);
 
 /** The properties of a class that a client asks for or sends; without a list, all. Names ignore letter case. */
 class PropertySelection {
@@ -31,7 +31,7 @@ public:
     const CMPIInstance* applied(const CMPIBroker* broker, const CMPIInstance* instance) const;
 
 private:
-    const Class& owner;
+    const Class& requested;
     std::vector<const char*> names{};
     bool isComplete;  ///< whether it has all properties of the class
 };
@@ -52,7 +52,7 @@ void associatorNames(const ClientRequest& request, const char* associationClass,
 void references(const ClientRequest& request, const char* associationClass, const char* role, const char** properties);
 void referenceNames(const ClientRequest& request, const char* associationClass, const char* role);
 
-/** The answers to reads of an association class. */
+/** The results of reads of an association class. */
 Paths associationPaths(const ClientRequest& request, const Class& association);
 Instances associationInstances(const ClientRequest& request, const Class& association);
 const CMPIInstance* associationAt(const ClientRequest& request, const Class& association);

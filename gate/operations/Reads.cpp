@@ -4,17 +4,18 @@
 
 namespace gate {
 
-void requireProperty(const Class& owner, std::string_view name) {
-    failIf(cim::findNamed(owner, name) == nullptr, CMPI_RC_ERR_NO_SUCH_PROPERTY, owner.name, " has no property ", name,
-           ".");
+void requireProperty(const Class& requested, std::string_view name) {
+    failIf(cim::findNamed(requested, name) == nullptr, CMPI_RC_ERR_NO_SUCH_PROPERTY, requested.name,
+           " has no property ", name, ".");
 }
 
 PropertySelection::PropertySelection(const char** list, const Class& itsClass)
-    : owner(itsClass), isComplete(list == nullptr) {
+    : requested(itsClass), isComplete(list == nullptr) {
     for (const char** name = list; list != nullptr && *name != nullptr; ++name) {
         names.push_back(*name);
     }
-    isComplete = std::all_of(owner.begin(), owner.end(), [&](const Property& property) { return has(property); });
+    isComplete =
+        std::all_of(requested.begin(), requested.end(), [&](const Property& property) { return has(property); });
 }
 
 bool PropertySelection::has(const Property& property) const {
@@ -24,7 +25,7 @@ bool PropertySelection::has(const Property& property) const {
 
 void PropertySelection::requireKnown() const {
     for (const char* name : names) {
-        requireProperty(owner, name);
+        requireProperty(requested, name);
     }
 }
 
@@ -36,7 +37,7 @@ const CMPIInstance* PropertySelection::applied(const CMPIBroker* broker, const C
     // Some managers put all properties of the class into a new instance; the filter removes them. The keys are listed,
     // too, since some managers hide properties that are only named as keys.
     std::vector<const char*> keys;
-    for (const Property& property : owner) {
+    for (const Property& property : requested) {
         keys.insert(keys.end(), property.isKey ? 1 : 0, property.name);
     }
     std::vector<const char*> shown = keys;
@@ -44,7 +45,7 @@ const CMPIInstance* PropertySelection::applied(const CMPIBroker* broker, const C
     keys.push_back(nullptr);
     shown.push_back(nullptr);
     tell<&CMPIInstanceFT::setPropertyFilter>(made, shown.data(), keys.data());
-    for (const Property& property : owner) {
+    for (const Property& property : requested) {
         const auto answer = ask<&CMPIInstanceFT::getProperty>(instance, property.name);
         require(answer.isOk() || isAbsent(answer.status), "return the value of a property", answer.status);
         const bool isPresent = answer.isOk() && (answer.value.state & (CMPI_notFound | CMPI_badValue)) == 0;
@@ -58,7 +59,7 @@ const CMPIInstance* PropertySelection::applied(const CMPIBroker* broker, const C
 
 namespace {
 
-// Functions that end the session before its answer is returned.
+// Functions that end the session before their results are returned.
 
 Instances instancesOf(const ClientRequest& request, const Class& requested, const char** properties) {
     const ProviderSession session(request);
@@ -82,19 +83,19 @@ void enumerateInstanceNames(const ClientRequest& request) {
     const Class& requested = request.requestedClass();
     const Paths paths =
         requested.isAssociation ? associationPaths(request, requested) : ProviderSession(request).names(requested);
-    request.give(paths);  // after the session
+    request.returnResults(paths);  // after the session
 }
 
 void enumerateInstances(const ClientRequest& request, const char** properties) {
     const Class& requested = request.requestedClass();
-    request.give(requested.isAssociation ? associationInstances(request, requested)
-                                         : instancesOf(request, requested, properties));
+    request.returnResults(requested.isAssociation ? associationInstances(request, requested)
+                                                  : instancesOf(request, requested, properties));
 }
 
 void getInstance(const ClientRequest& request, const char** properties) {
     const Class& requested = request.requestedClass();
-    request.give(Instances{requested.isAssociation ? associationAt(request, requested)
-                                                   : instanceAt(request, requested, properties)});
+    request.returnResults(Instances{requested.isAssociation ? associationAt(request, requested)
+                                                            : instanceAt(request, requested, properties)});
 }
 
 }  // namespace gate

@@ -159,8 +159,8 @@ bool ProviderConnection::load() {
     return !isOutdated;
 }
 
-void ProviderConnection::requireRead(const Class& owner, std::size_t count) {
-    Table* const table = tableOf(owner);
+void ProviderConnection::requireRead(const Class& requested, std::size_t count) {
+    Table* const table = tableOf(requested);
     if (table == nullptr || table->isRead) {
         return;
     }
@@ -169,7 +169,7 @@ void ProviderConnection::requireRead(const Class& owner, std::size_t count) {
     }
     if (count != table->count) {
         setOutdated();
-        fail(CMPI_RC_ERR_FAILED, "The provider could not read the records of ", owner.name,
+        fail(CMPI_RC_ERR_FAILED, "The provider could not read the records of ", requested.name,
              "; see the agent's log at level 3000. It reads them again; repeat the request.");
     }
     table->isRead = true;
@@ -206,14 +206,14 @@ void ProviderConnection::shutdown(const CMPIContext* context) {
 
 bool ProviderConnection::isConnectedTo(const CMPIBroker* manager) const {
     const std::lock_guard<std::mutex> lock(mutex);
-    return managersOwn == manager && brokersTables.bft == manager->bft && brokersTables.eft == manager->eft &&
-           brokersTables.xft == manager->xft && brokersTables.mft == manager->mft;
+    return managersOwn == manager && connectedBroker.bft == manager->bft && connectedBroker.eft == manager->eft &&
+           connectedBroker.xft == manager->xft && connectedBroker.mft == manager->mft;
 }
 
 void ProviderConnection::set(const CMPIBroker* manager) {
     const std::lock_guard<std::mutex> lock(mutex);
     managersOwn = manager;
-    brokersTables = manager == nullptr ? CMPIBroker{} : *manager;
+    connectedBroker = manager == nullptr ? CMPIBroker{} : *manager;
 }
 
 void ProviderConnection::endProcess() {

@@ -97,13 +97,13 @@ public:
     void requireCurrent(LockGuard& guard, bool mayBeOlder);
 
     /** The provider's table of a class; null if the class has no record file. */
-    Table* tableOf(const Class& owner) { return cim::findNamed(tables, owner.name); }
+    Table* tableOf(const Class& requested) { return cim::findNamed(tables, requested.name); }
 
     /**
      * Fails with CMPI_RC_ERR_FAILED unless the provider has as many records of a class as the file had when the
      * provider was loaded: it does not report that it could not read. Only the first call compares them.
      */
-    void requireRead(const Class& owner, std::size_t count);
+    void requireRead(const Class& requested, std::size_t count);
     ///@}
 
 private:
@@ -118,7 +118,7 @@ private:
     std::optional<WrappedBroker> wrapped{};
     mutable std::mutex mutex{};  ///< of the members below, for callers without the request lock
     const CMPIBroker* managersOwn = nullptr;
-    CMPIBroker brokersTables{};  ///< a copy of the broker, made when the provider was connected
+    CMPIBroker connectedBroker{};  ///< a copy of the broker, made when the provider was connected
 };
 
 extern ProviderConnection theConnection;

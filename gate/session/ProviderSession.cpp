@@ -7,13 +7,13 @@ namespace {
 constexpr const char** allProperties = nullptr;
 constexpr const char* any = nullptr;
 
-/** Returns answers with a function of the request's result. */
-template <auto function, class Answer>
-void giveAll(const ClientRequest& request, const std::vector<Answer>& answers) {
-    constexpr const char* task = "accept the answer";
-    for (const Answer& answer : answers) {
+/** Returns results with a function of the request's result. */
+template <auto function, class Object>
+void returnAll(const ClientRequest& request, const std::vector<Object>& results) {
+    constexpr const char* task = "accept the results";
+    for (const Object& object : results) {
         request.requireManager();
-        requireOk(task, tell<function>(request.result, answer));
+        requireOk(task, tell<function>(request.result, object));
     }
     request.requireManager();
     requireOk(task, tell<&CMPIResultFT::returnDone>(request.result));
@@ -78,7 +78,7 @@ ProviderResponse call(const ClientRequest& request, const LocalObject& path, Arg
 template <auto function, class... Arguments>
 ProviderResponse read(const ClientRequest& request, const LocalObject& path, Arguments... arguments) {
     ProviderResponse response = call<function>(request, path, arguments...);
-    require(!theConnection.wrappedBroker().hasFailed, "create the paths and instances of the answer");
+    require(!theConnection.wrappedBroker().hasFailed, "create the paths and instances of the results");
     requireFinished(response.isDone);
     return response;
 }
@@ -99,12 +99,12 @@ const Class& ClientRequest::requestedClass() const {
     return *found;
 }
 
-void ClientRequest::give(const Instances& instances) const {
-    giveAll<&CMPIResultFT::returnInstance>(*this, instances);
+void ClientRequest::returnResults(const Instances& instances) const {
+    returnAll<&CMPIResultFT::returnInstance>(*this, instances);
 }
 
-void ClientRequest::give(const Paths& paths) const {
-    giveAll<&CMPIResultFT::returnObjectPath>(*this, paths);
+void ClientRequest::returnResults(const Paths& paths) const {
+    returnAll<&CMPIResultFT::returnObjectPath>(*this, paths);
 }
 
 ProviderSession::ProviderSession(const ClientRequest& itsRequest, Access access)
@@ -116,29 +116,29 @@ ProviderSession::ProviderSession(const ClientRequest& itsRequest, Access access)
     theConnection.requireCurrent(guard, isReading);
 }
 
-Paths ProviderSession::names(const Class& owner) const {
-    const LocalObject path(nameSpaceOf(request.path), owner);
+Paths ProviderSession::names(const Class& requested) const {
+    const LocalObject path(nameSpaceOf(request.path), requested);
     Paths paths = read<&CMPIInstanceMIFT::enumerateInstanceNames>(request, path).paths;
-    theConnection.requireRead(owner, paths.size());
+    theConnection.requireRead(requested, paths.size());
     return paths;
 }
 
 /** Fails unless the provider has read the records of a class, or of both classes that an association connects. */
-void ProviderSession::requireRead(const Class& owner) const {
-    for (const Property& property : owner) {
+void ProviderSession::requireRead(const Class& requested) const {
+    for (const Property& property : requested) {
         if (property.referenceClass != nullptr) {
             requireRead(*findClass(property.referenceClass));
         }
     }
-    const auto* table = theConnection.tableOf(owner);
+    const auto* table = theConnection.tableOf(requested);
     if (table != nullptr && !table->isRead) {
-        names(owner);
+        names(requested);
     }
 }
 
-Instances ProviderSession::instances(const Class& owner) const {
-    requireRead(owner);
-    const LocalObject path(nameSpaceOf(request.path), owner);
+Instances ProviderSession::instances(const Class& requested) const {
+    requireRead(requested);
+    const LocalObject path(nameSpaceOf(request.path), requested);
     return read<&CMPIInstanceMIFT::enumerateInstances>(request, path, allProperties).instances;
 }
 
@@ -153,19 +153,19 @@ Instances ProviderSession::associators(const LocalObject& computer, const Class&
         .instances;
 }
 
-const CMPIInstance* ProviderSession::find(const LocalObject& keys, const Class& owner) const {
-    if (sameName(owner.name, agentClass)) {
+const CMPIInstance* ProviderSession::find(const LocalObject& keys, const Class& requested) const {
+    if (sameName(requested.name, agentClass)) {
         // A get does not end its response for other keys than the only instance's, as after an error.
-        const CMPIInstance* agent = firstOf(instances(owner));
+        const CMPIInstance* agent = firstOf(instances(requested));
         return agent != nullptr && samePath(pathOf(agent), keys.path()) ? agent : nullptr;
     }
-    requireRead(owner);
+    requireRead(requested);
     return firstOf(read<&CMPIInstanceMIFT::getInstance>(request, keys, allProperties).instances);
 }
 
-const CMPIInstance* ProviderSession::get(const LocalObject& keys, const Class& owner) const {
-    const CMPIInstance* instance = find(keys, owner);
-    failIf(instance == nullptr, CMPI_RC_ERR_NOT_FOUND, "There is no such ", owner.name, ".");
+const CMPIInstance* ProviderSession::get(const LocalObject& keys, const Class& requested) const {
+    const CMPIInstance* instance = find(keys, requested);
+    failIf(instance == nullptr, CMPI_RC_ERR_NOT_FOUND, "There is no such ", requested.name, ".");
     return instance;
 }
 

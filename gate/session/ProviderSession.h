@@ -33,11 +33,11 @@ struct ClientRequest {
     const Class& requestedClass() const;
 
     /**
-     * Returns the answers to the client and ends. Called when all answers exist, so that a request that fails returns
+     * Returns the results to the client and ends. Called when all of them exist, so that a request that fails returns
      * none. Fails if the object manager does not accept one.
      */
-    void give(const Instances& instances) const;
-    void give(const Paths& paths) const;
+    void returnResults(const Instances& instances) const;
+    void returnResults(const Paths& paths) const;
 };
 
 /**
@@ -59,18 +59,18 @@ public:
     explicit ProviderSession(const ClientRequest& itsRequest, Access access = Access::read);
 
     /** All instances of a class, in the request's namespace. */
-    Paths names(const Class& owner) const;
-    Instances instances(const Class& owner) const;
+    Paths names(const Class& requested) const;
+    Instances instances(const Class& requested) const;
 
     /** The leases or warranties of a computer, whose path has its keys. */
     Paths associatorNames(const LocalObject& computer, const Class& association) const;
     Instances associators(const LocalObject& computer, const Class& association) const;
 
     /** The instance with the keys; null if there is none. */
-    const CMPIInstance* find(const LocalObject& keys, const Class& owner) const;
+    const CMPIInstance* find(const LocalObject& keys, const Class& requested) const;
 
     /** The instance with the keys. Fails with CMPI_RC_ERR_NOT_FOUND if there is none. */
-    const CMPIInstance* get(const LocalObject& keys, const Class& owner) const;
+    const CMPIInstance* get(const LocalObject& keys, const Class& requested) const;
 
     /** Returns the new instance, which has default values. Fails if there is an instance with the keys. */
     const CMPIInstance* create(const LocalObject& keys);
@@ -88,7 +88,7 @@ public:
     }
 
 private:
-    void requireRead(const Class& owner) const;
+    void requireRead(const Class& requested) const;
 
     LockGuard guard;
     const ClientRequest& request;

@@ -125,8 +125,8 @@ void DataFile::rollBack(const std::string& before) const {
     }
 }
 
-const DataFile* dataFileOf(const Class& owner) {
-    return cim::findNamed(dataFiles, owner.name);
+const DataFile* dataFileOf(const Class& requested) {
+    return cim::findNamed(dataFiles, requested.name);
 }
 
 }  // namespace gate

@@ -57,6 +57,6 @@ struct DataFile {
 };
 
 /** The class's file; null for a class whose instances cannot be changed. */
-const DataFile* dataFileOf(const Class& owner);
+const DataFile* dataFileOf(const Class& requested);
 
 }  // namespace gate

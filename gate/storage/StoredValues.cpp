@@ -107,9 +107,9 @@ bool isRemoved(const std::string& value, const DataFile& file, const CMPIInstanc
     });
 }
 
-void requireNothingLost(const Class& owner, const DataFile& file, const CMPIInstance* before, const CMPIInstance* after,
-                        const Values& changes) {
-    for (const Property& property : owner) {
+void requireNothingLost(const Class& requested, const DataFile& file, const CMPIInstance* before,
+                        const CMPIInstance* after, const Values& changes) {
+    for (const Property& property : requested) {
         const std::string value = propertyOf(before, property).value_or(std::string());
         const std::string now = propertyOf(after, property).value_or(std::string());
         const bool isLost = storedValue(property, now).empty() && !storedValue(property, value).empty();
@@ -143,9 +143,9 @@ Values diff(const CMPIInstance* current, const Values& given, bool areListed) {
     return changes;
 }
 
-Values valuesToSend(const Class& owner, const CMPIInstance* current, const Values& changes) {
+Values valuesToSend(const Class& requested, const CMPIInstance* current, const Values& changes) {
     Values values = changes;
-    for (const Property& property : owner) {
+    for (const Property& property : requested) {
         if (!isPersonalized(property) || isAmong(property, changes)) {
             continue;
         }
@@ -167,9 +167,9 @@ bool altersFile(const DataFile& file, const CMPIInstance* current, const Values&
     });
 }
 
-void requireChanged(const Class& owner, const DataFile& file, const CMPIInstance* before, const CMPIInstance* after,
+void requireChanged(const Class& requested, const DataFile& file, const CMPIInstance* before, const CMPIInstance* after,
                     const Values& changes) {
-    requireNothingLost(owner, file, before, after, changes);
+    requireNothingLost(requested, file, before, after, changes);
     for (const auto& [property, value] : changes) {
         const auto now = propertyOf(after, *property);
         const bool isEqual = now && (isDate(*property) ? normalized(*now) == normalized(value) : *now == value);

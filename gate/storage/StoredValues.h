@@ -25,13 +25,13 @@ Values diff(const CMPIInstance* current, const Values& given, bool areListed);
  * The values to send to the provider: the changes, plus the current personalized values, which it would otherwise copy
  * from the preceding pair.
  */
-Values valuesToSend(const Class& owner, const CMPIInstance* current, const Values& changes);
+Values valuesToSend(const Class& requested, const CMPIInstance* current, const Values& changes);
 
 /** Whether the changes are certain to alter the content of a record file. */
 bool altersFile(const DataFile& file, const CMPIInstance* current, const Values& changes);
 
 /** Fails unless the instance, read again after a change, has the changes and has lost no other value. */
-void requireChanged(const Class& owner, const DataFile& file, const CMPIInstance* before, const CMPIInstance* after,
+void requireChanged(const Class& requested, const DataFile& file, const CMPIInstance* before, const CMPIInstance* after,
                     const Values& changes);
 
 }  // namespace gate

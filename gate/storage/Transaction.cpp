@@ -75,11 +75,11 @@ std::string Transaction::rollBack(const std::string& restorable) const {
 }
 
 void Transaction::create(const std::string& identifier, const Values& given, const std::function<void()>& returnPath) {
-    requireRoundTrip(file, {{cim::findNamed(owner, "InstanceID"), identifier}});
+    requireRoundTrip(file, {{cim::findNamed(requested, "InstanceID"), identifier}});
     requireRoundTrip(file, given);
     const FileState before = open(identifier.size() + 1 + sizeOf(given));
-    const bool exists = file.mayHave(before.content, identifier) && session.find(path, owner) != nullptr;
-    failIf(exists, CMPI_RC_ERR_ALREADY_EXISTS, owner.name, " ", identifier, " already exists.");
+    const bool exists = file.mayHave(before.content, identifier) && session.find(path, requested) != nullptr;
+    failIf(exists, CMPI_RC_ERR_ALREADY_EXISTS, requested.name, " ", identifier, " already exists.");
     requireReadOnlyValues(given);
     run(before, [&] {
         const CMPIInstance* current = session.create(path);
@@ -112,16 +112,16 @@ void Transaction::remove() {
 
 /** Makes the changes. Fails unless the provider has them. */
 void Transaction::apply(const CMPIInstance* current, const Values& changes) const {
-    session.modify(path, LocalObject({}, owner, valuesToSend(owner, current, changes)));
-    requireChanged(owner, file, current, session.get(path, owner), changes);
+    session.modify(path, LocalObject({}, requested, valuesToSend(requested, current, changes)));
+    requireChanged(requested, file, current, session.get(path, requested), changes);
 }
 
 /** Fails if the provider and its file have different numbers of records: the next write could lose some. */
 void Transaction::requireTable() const {
-    if (!file.hasRecords || (theConnection.tableOf(owner)->isVerified && file.records().isStored())) {
+    if (!file.hasRecords || (theConnection.tableOf(requested)->isVerified && file.records().isStored())) {
         return;
     }
-    const Paths paths = session.names(owner);
+    const Paths paths = session.names(requested);
     if (!paths.empty() && !file.records().isStored()) {
         storeTable(paths.front());
     }
@@ -132,17 +132,17 @@ void Transaction::requireTable() const {
         fail(CMPI_RC_ERR_FAILED, file.fileName,
              " has other records than the provider. It is read again; repeat the request.");
     }
-    theConnection.tableOf(owner)->isVerified = true;
+    theConnection.tableOf(requested)->isVerified = true;
 }
 
 /** Stores records that are only in memory, since their file was removed, by setting a value to itself. */
 void Transaction::storeTable(const CMPIObjectPath* record) const {
-    const LocalObject changed = localPath(record, owner);
-    const auto* number = std::find_if(owner.begin(), owner.end(), [](const Property& property) {
+    const LocalObject changed = localPath(record, requested);
+    const auto* number = std::find_if(requested.begin(), requested.end(), [](const Property& property) {
         return property.isWritable && property.type == CMPI_uint32;
     });
-    const std::string current = propertyOf(session.get(changed, owner), *number).value();
-    session.modify(changed, LocalObject({}, owner, {{number, current}}));
+    const std::string current = propertyOf(session.get(changed, requested), *number).value();
+    session.modify(changed, LocalObject({}, requested, {{number, current}}));
     file.commit({}, true);
 }
 
@@ -150,9 +150,9 @@ void Transaction::storeTable(const CMPIObjectPath* record) const {
 void Transaction::requireReadOnlyValues(const Values& given) const {
     const bool haveReadOnly =
         std::any_of(given.begin(), given.end(), [](const auto& value) { return !value.first->isWritable; });
-    const Paths records = haveReadOnly ? session.names(owner) : Paths();
+    const Paths records = haveReadOnly ? session.names(requested) : Paths();
     if (!records.empty()) {
-        diff(session.get(localPath(records.front(), owner), owner), given, false);  // fails if one differs
+        diff(session.get(localPath(records.front(), requested), requested), given, false);  // fails if one differs
     }
 }
 

@@ -21,7 +21,7 @@ namespace gate {
 class Transaction {
 public:
     Transaction(ProviderSession& itsSession, const Class& itsClass, const DataFile& itsFile, const LocalObject& itsPath)
-        : session(itsSession), owner(itsClass), file(itsFile), path(itsPath) {}
+        : session(itsSession), requested(itsClass), file(itsFile), path(itsPath) {}
 
     /**
      * Creates a record with these values. Fails with CMPI_RC_ERR_ALREADY_EXISTS if there is one with the identifier.
@@ -47,7 +47,7 @@ private:
     void requireReadOnlyValues(const Values& given) const;
 
     ProviderSession& session;
-    const Class& owner;
+    const Class& requested;
     const DataFile& file;
     const LocalObject& path;
 };

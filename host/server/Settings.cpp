@@ -32,8 +32,8 @@ void readSeconds(TableReader& table, const char* key, std::chrono::seconds& targ
 void readLimits(TableReader table, Limits& limits) {
     readNumber(table, "connections", limits.connections, mostConnections);
     readNumber(table, "connections_per_address", limits.connectionsPerAddress, mostConnections);
-    readNumber(table, "lists_at_work", limits.runningLists, 10'000);
-    readNumber(table, "requests_at_work", limits.runningRequests, 10'000);
+    readNumber(table, "running_lists", limits.runningLists, 10'000);
+    readNumber(table, "running_requests", limits.runningRequests, 10'000);
     readNumber(table, "response_results", limits.responseResults, 1'000'000'000);
     readNumber(table, "request_bytes", limits.requestBytes, std::int64_t{1} << 30U);
     readNumber(table, "xml_depth", limits.xmlDepth, 200);

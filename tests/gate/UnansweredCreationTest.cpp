@@ -33,7 +33,7 @@ protected:
 TEST_F(UnansweredCreationTest, IsRolledBack) {
     create("bystander");
     const std::string before = file();
-    EXPECT_THAT(createUnanswered(), isRefused(CMPI_RC_ERR_FAILED, "object manager could not accept the answer"));
+    EXPECT_THAT(createUnanswered(), isRefused(CMPI_RC_ERR_FAILED, "object manager could not accept the results"));
     EXPECT_THAT(identifiers(), ElementsAre("bystander"));
     EXPECT_EQ(file(), before);
 }

@@ -78,8 +78,8 @@ TEST_F(SettingsTest, EachKeyOfTheLimitsSetsItsOwnLimit) {
     const std::vector<std::pair<std::string, std::function<std::int64_t(const Limits&)>>> keys{
         {"connections", [](const Limits& limits) { return limits.connections; }},
         {"connections_per_address", [](const Limits& limits) { return limits.connectionsPerAddress; }},
-        {"lists_at_work", [](const Limits& limits) { return limits.runningLists; }},
-        {"requests_at_work", [](const Limits& limits) { return limits.runningRequests; }},
+        {"running_lists", [](const Limits& limits) { return limits.runningLists; }},
+        {"running_requests", [](const Limits& limits) { return limits.runningRequests; }},
         {"queue_seconds", [](const Limits& limits) { return limits.queueTime.count(); }},
         {"response_results", [](const Limits& limits) { return limits.responseResults; }},
         {"request_bytes", [](const Limits& limits) { return limits.requestBytes; }},
