@@ -140,18 +140,18 @@ struct HttpServer::Endpoint {
         if (exchange == nullptr) {  // there was no memory for it
             return;
         }
-        const RequestHandler& handler = static_cast<Endpoint*>(self)->server.handler;
+        const auto& server = static_cast<Endpoint*>(self)->server;
         Connection& connection = *exchange->connection;
         if (!exchange->isLogged) {
-            handler.logIncomplete(*exchange);
+            server.handler.logIncomplete(*exchange);
         }
         if (exchange->isBodyIgnored) {
-            discardInput(connection.socket(), handler.mostIgnored());
+            discardInput(connection.socket(), server.handler.mostIgnored());
         }
         // Bytes that still arrive belong to the body of this request, not to the head of another.
         const bool isLast = exchange->isBodyIgnored || code != MHD_REQUEST_TERMINATED_COMPLETED_OK;
         connection.enter(isLast ? Connection::Phase::refusal : Connection::Phase::idle);
-        if (!isLast && handler.isIdle()) {
+        if (!isLast && server.table.size() == 1) {  // with several, the processors have other work
             awaitInputBriefly(connection.socket());
         }
     }

@@ -45,12 +45,6 @@ public:
         std::size_t amount = 0;
     };
 
-    /** Whether no request has a share. */
-    bool isUnused() const {
-        const std::lock_guard<std::mutex> lock(mutex);
-        return held == 0;
-    }
-
     /** Whether a request waits for its share. */
     bool isAwaited() const {
         const std::lock_guard<std::mutex> lock(mutex);
@@ -83,7 +77,7 @@ private:
         released.notify_one();
     }
 
-    static constexpr int yields = 10;  ///< before a thread sleeps: most requests end sooner than it could be woken
+    static constexpr int yields = 2;  ///< before a thread sleeps: most requests end sooner than it could be woken
     const std::size_t limit;
     mutable std::mutex mutex;
     std::condition_variable released;

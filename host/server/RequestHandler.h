@@ -75,9 +75,6 @@ public:
     void logIncomplete(Exchange& exchange) const;
     void logIncomplete(const Connection& connection) const;
 
-    /** Whether no request is running. */
-    bool isIdle() const { return requests.isUnused() && lists.isUnused(); }
-
     /** Whether a response waits until clients have received others. */
     bool isShortOfResults() const { return results.isAwaited(); }
 
