@@ -69,7 +69,7 @@ constexpr std::size_t leases = 100;
 using Requests = std::vector<bench::ExpectedRequest>;
 
 /** A kind of requests, each with another number. */
-struct Operation {
+struct TimedRequests {
     const char* name;
     Requests (*timed)(int number, bool isGated);
     Requests (*after)();  ///< restores the number of leases
@@ -111,7 +111,7 @@ Requests deletion() {
     return {{cimhost::Request::deleteInstance(newPath())}};
 }
 
-constexpr Operation operations[] = {
+constexpr TimedRequests allRequests[] = {
     {"read", read, noRequests},
     {"modification", modification, noRequests},
     {"creation with a value", creation, deletion},
@@ -123,7 +123,7 @@ void perform(bench::Environment& environment, const bench::Interfaces& interface
     }
 }
 
-void measure(bench::Environment& environment, const Case& tested, const Operation& operation, int count) {
+void measure(bench::Environment& environment, const Case& tested, const TimedRequests& requests, int count) {
     syncs = Syncs::real;
     const auto entry = tested.isGated ? bench::ProviderEntry::ofGate() : bench::ProviderEntry::ofProvider();
     const bench::Interfaces interfaces = environment.loadBoth(leases, entry);
@@ -131,28 +131,28 @@ void measure(bench::Environment& environment, const Case& tested, const Operatio
     std::vector<double> values;
     int timedSyncs = 0;
     for (int index = -2; index < count; ++index) {
-        const Requests timed = operation.timed(index + 2, tested.isGated);
+        const Requests timed = requests.timed(index + 2, tested.isGated);
         const int syncsBefore = syncCount;
         const double time = timeOf([&] { perform(environment, interfaces, timed); });
         if (index >= 0) {
             values.push_back(time);  // without the first two, which also create the saved copies
             timedSyncs += syncCount - syncsBefore;
         }
-        perform(environment, interfaces, operation.after());
+        perform(environment, interfaces, requests.after());
     }
     syncs = Syncs::real;
-    std::printf("%-24s %-28s %8.0f %8.1f\n", operation.name, tested.name, median(values),
+    std::printf("%-24s %-28s %8.0f %8.1f\n", requests.name, tested.name, median(values),
                 static_cast<double>(timedSyncs) / count);
 }
 
 void run(int count) {
     bench::Environment environment;
     std::printf("%-24s %-28s %8s %8s\n", "one among 100 leases", "", "us", "syncs");
-    for (const Operation& operation : operations) {
+    for (const TimedRequests& requests : allRequests) {
         for (const Case& each :
              {Case{"provider alone", false, Syncs::real}, Case{"gate, syncs omitted", true, Syncs::omitted},
               Case{"gate", true, Syncs::real}, Case{"gate, each sync takes 1 ms", true, Syncs::slow}}) {
-            measure(environment, each, operation, count);
+            measure(environment, each, requests, count);
         }
     }
     environment.unload();

@@ -101,58 +101,58 @@ TEST(Stub, AssignsTheIndicationFunctions) {
     EXPECT_EQ(table.disableIndications(mi, noContext).rc, CMPI_RC_ERR_FAILED);
 }
 
-// A broker that creates one instance, and a request for it.
-struct Request {
+// The calls that a provider makes during a request, and the objects that it receives.
+struct Observed {
     bool keyIsThere = true;
     std::string log;
     CMPIInstanceFT instanceTable{};
     CMPIInstance instance{this, &instanceTable};
     CMPIString message{this, nullptr};
-} request;
+} observed;
 
 CMPIData keyOf(const CMPIObjectPath*, const char* name, CMPIStatus* rc) {
-    request.log += std::string("key ") + name + "\n";
-    rc->rc = request.keyIsThere ? CMPI_RC_OK : CMPI_RC_ERR_NOT_FOUND;
+    observed.log += std::string("key ") + name + "\n";
+    rc->rc = observed.keyIsThere ? CMPI_RC_OK : CMPI_RC_ERR_NOT_FOUND;
     return {};
 }
 
 CMPIString* makeString(const CMPIBroker*, const char* text, CMPIStatus*) {
-    request.log += std::string("string ") + text + "\n";
-    return &request.message;
+    observed.log += std::string("string ") + text + "\n";
+    return &observed.message;
 }
 
 CMPIInstance* makeInstance(const CMPIBroker*, const CMPIObjectPath*, CMPIStatus*) {
-    request.log += "instance\n";
-    return &request.instance;
+    observed.log += "instance\n";
+    return &observed.instance;
 }
 
 CMPIStatus setProperty(const CMPIInstance*, const char* name, const CMPIValue* value, CMPIType type) {
     EXPECT_EQ(type, CMPI_chars);
-    request.log += std::string(name) + "=" + reinterpret_cast<const char*>(value) + "\n";
+    observed.log += std::string(name) + "=" + reinterpret_cast<const char*>(value) + "\n";
     return {};
 }
 
 CMPIStatus returnInstance(const CMPIResult*, const CMPIInstance* instance) {
-    request.log += instance == &request.instance ? "returned\n" : "returned another\n";
+    observed.log += instance == &observed.instance ? "returned\n" : "returned another\n";
     return {};
 }
 
 CMPIStatus returnPath(const CMPIResult*, const CMPIObjectPath*) {
-    request.log += "path\n";
+    observed.log += "path\n";
     return {};
 }
 
 CMPIStatus returnDone(const CMPIResult*) {
-    request.log += "done\n";
+    observed.log += "done\n";
     return {};
 }
 
 class ProviderInC : public testing::Test {
 protected:
     ProviderInC() {
-        request.log.clear();
-        request.keyIsThere = true;
-        request.instanceTable.setProperty = setProperty;
+        observed.log.clear();
+        observed.keyIsThere = true;
+        observed.instanceTable.setProperty = setProperty;
         makers.newString = makeString;
         makers.newInstance = makeInstance;
         pathTable.getKey = keyOf;
@@ -172,20 +172,20 @@ protected:
 
 TEST_F(ProviderInC, ReturnsAnInstanceThroughTheTables) {
     EXPECT_EQ(mi->ft->getInstance(mi, noContext, &result, &path, nullptr).rc, CMPI_RC_OK);
-    EXPECT_EQ(request.log, "key Id\ninstance\nName=small\nreturned\ndone\n");
+    EXPECT_EQ(observed.log, "key Id\ninstance\nName=small\nreturned\ndone\n");
 }
 
 TEST_F(ProviderInC, ReturnsAMessageIfThereIsNoInstance) {
-    request.keyIsThere = false;
+    observed.keyIsThere = false;
     const CMPIStatus status = mi->ft->getInstance(mi, noContext, &result, &path, nullptr);
     EXPECT_EQ(status.rc, CMPI_RC_ERR_NOT_FOUND);
-    EXPECT_EQ(status.msg, &request.message);
-    EXPECT_EQ(request.log, "key Id\nstring no such thing\n");
+    EXPECT_EQ(status.msg, &observed.message);
+    EXPECT_EQ(observed.log, "key Id\nstring no such thing\n");
 }
 
 TEST_F(ProviderInC, ReturnsAPathThroughTheTables) {
     EXPECT_EQ(mi->ft->enumerateInstanceNames(mi, noContext, &result, &path).rc, CMPI_RC_OK);
-    EXPECT_EQ(request.log, "path\ndone\n");
+    EXPECT_EQ(observed.log, "path\ndone\n");
 }
 
 }  // namespace

@@ -144,7 +144,7 @@ INSTANTIATE_RECORD_TEST(BrokerFailureTest);
 /** Each call that a request makes fails, in two ways. Table and file stay consistent. */
 class EveryCallFailsTest : public RecordTest {
 protected:
-    using Request = std::function<Outcome()>;
+    using RequestCall = std::function<Outcome()>;
 
     /** Returns the expected code of the request when the call at an index fails. */
     using ExpectedCode = std::function<CMPIrc(std::size_t index, bool isSilent)>;
@@ -158,7 +158,7 @@ protected:
      * @param maximumDone maximum number of calls of returnDone
      * @param after called after each request, to check and restore the state
      */
-    void failInTurn(const Request& request, const ExpectedCode& expected, const std::function<void()>& after,
+    void failInTurn(const RequestCall& request, const ExpectedCode& expected, const std::function<void()>& after,
                     int maximumDone = 1) {
         broker.forget();
         EXPECT_EQ(request().rc, CMPI_RC_OK);

@@ -65,8 +65,8 @@ protected:
             alter, path(instanceId));
     }
 
-    template <class Request>
-    Outcome call(Request request, const Alter& alter, const ObjectPath& path) {
+    template <class Call>
+    Outcome call(Call request, const Alter& alter, const ObjectPath& path) {
         CMPIInstanceMI* interface = provider().instanceMI();
         return provider().call([&](auto& scope, const CMPIContext* context, const CMPIResult* result) {
             Altered<CMPIResult> altered(result);
@@ -98,13 +98,13 @@ protected:
     }
 
     /** A named request. */
-    struct Request {
+    struct RequestCase {
         const char* name;
         std::function<CMPIStatus(const CMPIContext*, const CMPIResult*, const CMPIObjectPath*)> run;
     };
 
     /** Returns every request that is dispatched by class. */
-    std::vector<Request> dispatchedRequests() {
+    std::vector<RequestCase> dispatchedRequests() {
         CMPIInstanceMI* mi = provider().instanceMI();
         CMPIAssociationMI* ai = provider().associationMI();
         const std::string setting = std::string(kind().className) + "Setting";
@@ -128,7 +128,7 @@ protected:
     }
 
     /** Makes a request with a path "A" of which one part throws. */
-    Outcome callWithThrowing(const ThrowingPart& part, const Request& request) {
+    Outcome callWithThrowing(const ThrowingPart& part, const RequestCase& request) {
         return provider().call([&](auto& scope, const CMPIContext* context, const CMPIResult* result) {
             Altered<CMPIString> text(broker.string("root/cimv2"));
             throwFrom<std::runtime_error>(text.table.getCharPtr);
@@ -240,7 +240,7 @@ TEST_P(ExceptionTest, ExceptionsFromTheRequestsPathAreCaught) {
 TEST_P(ExceptionTest, ExceptionsFromClassNameAndNamespaceAreCaughtInEveryRequest) {
     createAll({"A"});
     for (const ThrowingPart& part : throwingParts) {
-        for (const Request& request : dispatchedRequests()) {
+        for (const RequestCase& request : dispatchedRequests()) {
             SCOPED_TRACE(std::string(part.name) + ", " + request.name);
             agentEnvironment::forgetLog();
             const Outcome outcome = callWithThrowing(part, request);

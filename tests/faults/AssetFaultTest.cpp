@@ -43,7 +43,7 @@ protected:
     }
 
     TestEnvironment environment;
-    const Request& request;
+    const RequestCase& request;
     const ExpectedOutcome expected;
 };
 
@@ -114,7 +114,7 @@ TEST_F(AssetFaultTest, ASecondFailureLeavesAtMostATemporaryFile) {
             fault.then = second;
             SCOPED_TRACE(testing::PrintToString(fault));
             environment.restart();
-            const Response response = environment.ask(request, &fault);
+            const ObservedResponse response = environment.ask(request, &fault);
             EXPECT_EQ(response.outcome.rc, CMPI_RC_OK);
             EXPECT_EQ(response.leakedDescriptors, 0);
             const auto temporary = temporaryFiles().size();

@@ -84,7 +84,7 @@ void makeUnreadable(const fs::path& file) {
     fs::create_directory(file);
 }
 
-void runWithoutAsset(TestEnvironment& environment, const Request& request, ExpectedOutcome& expected) {
+void runWithoutAsset(TestEnvironment& environment, const RequestCase& request, ExpectedOutcome& expected) {
     environment.restart();
     makeUnreadable(environment.dataDirectory() / assetFile);
     expected.withoutAsset = environment.ask(request).outcome;
@@ -116,7 +116,7 @@ bool mayPreventReading(const Fault& fault) {
 
 }  // namespace
 
-ExpectedOutcome runWithoutFaults(TestEnvironment& environment, const Request& request) {
+ExpectedOutcome runWithoutFaults(TestEnvironment& environment, const RequestCase& request) {
     ExpectedOutcome expected;
     expected.file = request.changes != nullptr ? request.changes : leaseFile;
     if (request.path.className == classOf(assetFile)) {
@@ -142,7 +142,7 @@ void expectPartOfAnswer(const ExpectedOutcome& expected, const testsupport::Outc
     EXPECT_LE(outcome.doneCount, expected.response.outcome.doneCount);
 }
 
-void expectSetInOrder(const ExpectedOutcome& expected, const Request& request, const Lines& now) {
+void expectSetInOrder(const ExpectedOutcome& expected, const RequestCase& request, const Lines& now) {
     Lines partial = expected.before;
     std::vector<Lines> possible{partial};
     for (const NamedValue& property : request.instance.properties) {

@@ -7,7 +7,7 @@
 namespace faults {
 
 struct ExpectedOutcome {
-    Response response;
+    ObservedResponse response;
     testsupport::Outcome withoutAsset;   ///< for asset data: the outcome if asset.dat cannot be read (docs/classes)
     testsupport::Outcome withoutSystem;  ///< likewise, if the instrumentation has no system node either
     std::string file;                    ///< the file that the request changes; Lease.dat if it only reads
@@ -18,7 +18,7 @@ struct ExpectedOutcome {
 };
 
 /** Makes the request without faults, after a restart. */
-ExpectedOutcome runWithoutFaults(TestEnvironment& environment, const Request& request);
+ExpectedOutcome runWithoutFaults(TestEnvironment& environment, const RequestCase& request);
 
 /**
  * Expects a part of the results of the request without faults, or with an unreadable asset.dat: a subsequence of the
@@ -27,7 +27,7 @@ ExpectedOutcome runWithoutFaults(TestEnvironment& environment, const Request& re
 void expectPartOfAnswer(const ExpectedOutcome& expected, const testsupport::Outcome& outcome, bool lacksMemory = false);
 
 /** Expects that the request set its first N properties and left the others unchanged. */
-void expectSetInOrder(const ExpectedOutcome& expected, const Request& request, const Lines& now);
+void expectSetInOrder(const ExpectedOutcome& expected, const RequestCase& request, const Lines& now);
 
 /** Returns whether a fault prevents the provider from reading asset.dat in a modification, but not from writing it. */
 bool preventsReading(const Fault& fault);

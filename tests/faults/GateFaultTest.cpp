@@ -17,13 +17,13 @@ using testing::AnyOf;
 using testing::IsEmpty;
 using testing::Not;
 
-class GateFaultTest : public testing::TestWithParam<Request> {
+class GateFaultTest : public testing::TestWithParam<RequestCase> {
 protected:
     GateFaultTest() : environment(TestEnvironment::Library::gate), expected(runWithoutFaults(environment, request())) {
         EXPECT_EQ(expected.response.outcome.rc, CMPI_RC_OK) << expected.response.outcome.message;
     }
 
-    static const Request& request() { return GetParam(); }
+    static const RequestCase& request() { return GetParam(); }
     static std::string file() { return request().changes; }
 
     static Lines sorted(Lines lines) {
@@ -43,7 +43,7 @@ protected:
     void failOne(const Fault& fault) {
         environment.restart();
         now();  // loads the provider: GateLoadFaultTest is about faults while it reads its files
-        const Response response = environment.ask(request(), &fault);
+        const ObservedResponse response = environment.ask(request(), &fault);
         EXPECT_FALSE(response.outcome.threw);
         EXPECT_EQ(response.leakedDescriptors, 0);
         if (response.outcome.rc == CMPI_RC_OK) {

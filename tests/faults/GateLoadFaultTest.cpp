@@ -39,7 +39,7 @@ protected:
     }
 
     /** Makes a change after the process that owned the directory was killed. */
-    Response changeAfterOtherOwner(const Fault* fault) {
+    ObservedResponse changeAfterOtherOwner(const Fault* fault) {
         environment.restart();
         leases();  // loads the provider
         std::filesystem::remove(environment.dataDirectory() / "owner");
@@ -72,7 +72,7 @@ protected:
     }
 
     /** Expects the leases after the change if it was answered OK or its message admits that, otherwise those before. */
-    void expectStored(const Response& response, const Lines& after, const Lines& before) {
+    void expectStored(const ObservedResponse& response, const Lines& after, const Lines& before) {
         EXPECT_FALSE(response.outcome.threw);
         environment.unload();
         const Lines stored = leases();

@@ -40,9 +40,9 @@ std::string valueOf(int step) {
 }
 
 /** Returns a step of the load: modifies asset data or a lease, creates a warranty or deletes it, in turn. */
-Request stepOf(int step) {
+RequestCase stepOf(int step) {
     const auto with = [](const char* request, const std::string& identifier, std::vector<cimhost::NamedValue> values) {
-        Request made = requestNamed(request);
+        RequestCase made = requestNamed(request);
         if (!identifier.empty()) {
             made.path =
                 testsupport::objectPath("root/cimv2", made.path.className, {named("InstanceID", text(identifier))});
@@ -121,7 +121,7 @@ private:
     void work(int output, int operations) {
         for (int step = 0;; ++step) {
             const Fault killed{anyOnFiles, operations, false, 0, [] { std::raise(SIGKILL); }};
-            const Response response = environment.ask(stepOf(step), operations > 0 ? &killed : nullptr);
+            const ObservedResponse response = environment.ask(stepOf(step), operations > 0 ? &killed : nullptr);
             for (const auto& each : onFiles(response.counts)) {
                 operations -= each.second;
             }

@@ -16,9 +16,9 @@ using testing::AnyOf;
 
 constexpr int records = 4;
 
-class KillTest : public testing::TestWithParam<Request> {
+class KillTest : public testing::TestWithParam<RequestCase> {
 protected:
-    static const Request& request() { return GetParam(); }
+    static const RequestCase& request() { return GetParam(); }
     static std::string file() { return request().changes; }
 
     void restart() {

@@ -33,7 +33,7 @@ protected:
 
     /** Expects that every changing request has the same result as without a log. */
     void expectChangesAsWithoutLog() {
-        for (const Request& request : changingRequests()) {
+        for (const RequestCase& request : changingRequests()) {
             SCOPED_TRACE(request.name);
             environment.unload();
             TestEnvironment without;
@@ -63,7 +63,7 @@ protected:
 };
 
 TEST_F(LogFaultTest, FailuresOfTheLogDoNotFailTheRequest) {
-    const Request& request = requestNamed("DeleteWarranty");
+    const RequestCase& request = requestNamed("DeleteWarranty");
     environment.restart();
     const Counts counts = environment.ask(request).counts;
     const std::string before = environment.filesAtFirst().at(warrantyFile);
@@ -72,7 +72,7 @@ TEST_F(LogFaultTest, FailuresOfTheLogDoNotFailTheRequest) {
     const auto failOne = [&](const Fault& fault) {
         environment.restart();
         const int openBefore = openDescriptors();
-        const Response response = environment.ask(request, &fault);
+        const ObservedResponse response = environment.ask(request, &fault);
         EXPECT_EQ(response.outcome.rc, CMPI_RC_OK);
         EXPECT_FALSE(response.outcome.threw);
         environment.ask(repairOf(warrantyFile));
@@ -90,7 +90,7 @@ TEST_F(LogFaultTest, ADirectoryThatIsRemovedDuringRotationIsNotCreatedAgain) {
     const fs::path away = environment.directory() / "away";
     fs::create_directory(directory);
     configure(directory / "agent.log");
-    const Request& request = requestNamed("DeleteWarranty");
+    const RequestCase& request = requestNamed("DeleteWarranty");
     const Counts counts = environment.ask(request).counts;
     ASSERT_GT(counts.at(operationRename), 0) << "the log is rotated";
     for (int number = 1; number <= counts.at(operationRename); ++number) {
@@ -108,7 +108,7 @@ TEST_F(LogFaultTest, ADirectoryThatIsRemovedDuringRotationIsNotCreatedAgain) {
 
 /** Opening the pipe would wait for a reader. */
 TEST_F(LogFaultTest, APipeInPlaceOfTheLogIsNotOpenedDuringRotation) {
-    const Request& request = requestNamed("DeleteWarranty");
+    const RequestCase& request = requestNamed("DeleteWarranty");
     const Fault planting{operationOpen, 1, false, 0, [&] {
                              EXPECT_FALSE(fs::exists(log)) << "the full log was renamed";
                              EXPECT_EQ(mkfifo(log.c_str(), 0600), 0);

@@ -21,7 +21,7 @@ enum class Deviation {
     assetNotRead,         ///< the provider continues after a failure to read asset.dat and writes all keys
 };
 
-Deviation deviationFor(const Request& request, const Fault& fault) {
+Deviation deviationFor(const RequestCase& request, const Fault& fault) {
     if (request.instance.properties.empty()) {
         return Deviation::none;
     }
@@ -31,17 +31,17 @@ Deviation deviationFor(const Request& request, const Fault& fault) {
     return isOnFiles(fault.kind) ? Deviation::none : Deviation::partialModification;
 }
 
-class RequestFaultTest : public testing::TestWithParam<Request> {
+class RequestFaultTest : public testing::TestWithParam<RequestCase> {
 protected:
     RequestFaultTest() : expected(runWithoutFaults(environment, request())) {}
 
-    static const Request& request() { return GetParam(); }
+    static const RequestCase& request() { return GetParam(); }
     static bool changes() { return request().changes != nullptr; }
     const std::string& file() const { return expected.file; }
 
     void failOne(const Fault& fault) {
         environment.restart();
-        const Response response = environment.ask(request(), &fault);
+        const ObservedResponse response = environment.ask(request(), &fault);
         EXPECT_FALSE(response.outcome.threw) << "an exception left the provider";
         EXPECT_EQ(response.outcome.rc, expected.response.outcome.rc);
         EXPECT_FALSE(response.outcome.hasMessage);

@@ -142,22 +142,22 @@ CMPIStatus referenceNames(const Arguments& with) {
 constexpr const char* leaseSetting = "VELKO_LeaseSetting";
 constexpr const char* warrantySetting = "VELKO_WarrantySetting";
 
-Request reading(const char* name, ObjectPath path, CMPIStatus (*call)(const Arguments&)) {
+RequestCase reading(const char* name, ObjectPath path, CMPIStatus (*call)(const Arguments&)) {
     return {name, std::move(path), {}, call};
 }
 
-Request changing(const char* name, const char* file, ObjectPath path, std::vector<NamedValue> values,
-                 CMPIStatus (*call)(const Arguments&)) {
+RequestCase changing(const char* name, const char* file, ObjectPath path, std::vector<NamedValue> values,
+                     CMPIStatus (*call)(const Arguments&)) {
     cimhost::Instance instance = testsupport::instance(path, std::move(values));
     return {name, std::move(path), std::move(instance), call, file};
 }
 
 }  // namespace
 
-const std::vector<Request>& allRequests() {
+const std::vector<RequestCase>& allRequests() {
     static const ObjectPath leaseOfComputer = identified("VELKO_Lease", "/system/computer");
     static const ObjectPath warrantyOfComputer = identified("VELKO_Warranty", "/system/computer");
-    static const std::vector<Request> all{
+    static const std::vector<RequestCase> all{
         changing("CreateLease", leaseFile, identified("VELKO_Lease", "lease that is new"), {}, &create),
         changing("ModifyLease", leaseFile, leaseOfComputer, leaseValues(), &modify),
         changing("EmptyLessor", leaseFile, leaseOfComputer, {named("Lessor", text(""))}, &modify),
@@ -205,9 +205,9 @@ const std::vector<Request>& allRequests() {
     return all;
 }
 
-std::vector<Request> changingRequests() {
-    std::vector<Request> requests;
-    for (const Request& request : allRequests()) {
+std::vector<RequestCase> changingRequests() {
+    std::vector<RequestCase> requests;
+    for (const RequestCase& request : allRequests()) {
         if (request.changes != nullptr) {
             requests.push_back(request);
         }
@@ -215,8 +215,8 @@ std::vector<Request> changingRequests() {
     return requests;
 }
 
-const Request& requestNamed(const std::string& name) {
-    for (const Request& request : allRequests()) {
+const RequestCase& requestNamed(const std::string& name) {
+    for (const RequestCase& request : allRequests()) {
         if (request.name == name) {
             return request;
         }
@@ -227,7 +227,7 @@ const Request& requestNamed(const std::string& name) {
 namespace {
 
 /** Returns a change of one value per file. @param number value of the record's term; a new record has 1 */
-std::map<std::string, Request> smallChanges(unsigned int number) {
+std::map<std::string, RequestCase> smallChanges(unsigned int number) {
     return {
         {leaseFile, changing("repair", leaseFile, identified("VELKO_Lease", "lease number 1"),
                              {named("LeaseTerm", uint32(number))}, &modify)},
@@ -239,13 +239,13 @@ std::map<std::string, Request> smallChanges(unsigned int number) {
 
 }  // namespace
 
-const Request& repairOf(const std::string& dataFile) {
-    static const std::map<std::string, Request> repairs = smallChanges(1);
+const RequestCase& repairOf(const std::string& dataFile) {
+    static const std::map<std::string, RequestCase> repairs = smallChanges(1);
     return repairs.at(dataFile);
 }
 
-const Request& otherChangeOf(const std::string& dataFile) {
-    static const std::map<std::string, Request> detours = smallChanges(3);
+const RequestCase& otherChangeOf(const std::string& dataFile) {
+    static const std::map<std::string, RequestCase> detours = smallChanges(3);
     return detours.at(dataFile);
 }
 
@@ -253,7 +253,7 @@ std::string classOf(const std::string& dataFile) {
     return repairOf(dataFile).path.className;
 }
 
-std::ostream& operator<<(std::ostream& stream, const Request& request) {
+std::ostream& operator<<(std::ostream& stream, const RequestCase& request) {
     return stream << request.name;
 }
 

@@ -29,7 +29,7 @@ protected:
     /** Rewrites the file with a fault and returns its content. */
     std::string rewriteWith(const Fault& fault) {
         restart();
-        const Response response = environment.ask(requestNamed("ModifyLease"), &fault);
+        const ObservedResponse response = environment.ask(requestNamed("ModifyLease"), &fault);
         EXPECT_EQ(response.outcome.rc, CMPI_RC_OK);
         return environment.files().at(leaseFile);
     }
@@ -181,7 +181,7 @@ class OperationsOfRewriteTest : public testing::TestWithParam<const char*> {};
 
 TEST_P(OperationsOfRewriteTest, AreOneOpenOneWritePerLineAndOneClose) {
     TestEnvironment environment;
-    const Request& request = requestNamed(GetParam());
+    const RequestCase& request = requestNamed(GetParam());
     FileContents files = environment.filesAtFirst();
     files[leaseFile] = leaseRecords(leases);
     files[warrantyFile] = warrantyRecords(leases);

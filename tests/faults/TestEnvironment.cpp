@@ -151,11 +151,11 @@ void TestEnvironment::unload() {
     loaded.reset();
 }
 
-Response TestEnvironment::ask(const Request& request, const Fault* fault) {
+ObservedResponse TestEnvironment::ask(const RequestCase& request, const Fault* fault) {
     testsupport::ProviderLibrary& provider = library();
     CMPIInstanceMI* instances = provider.instanceMI();
     CMPIAssociationMI* associations = provider.associationMI();
-    Response response;
+    ObservedResponse response;
     broker.forget();
     const int openBefore = openDescriptors();
     response.outcome = provider.call([&](auto& scope, const CMPIContext* context, const CMPIResult* result) {

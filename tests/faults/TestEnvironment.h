@@ -31,7 +31,7 @@ struct Arguments {
 };
 
 /** A request for the provider. */
-struct Request {
+struct RequestCase {
     const char* name;
     cimhost::ObjectPath path;
     cimhost::Instance instance;
@@ -39,10 +39,10 @@ struct Request {
     const char* changes = nullptr;  ///< the data file that it changes; null if it only reads
 };
 
-std::ostream& operator<<(std::ostream& stream, const Request& request);
+std::ostream& operator<<(std::ostream& stream, const RequestCase& request);
 
 /** Result of a request. */
-struct Response {
+struct ObservedResponse {
     testsupport::Outcome outcome;
     Counts counts;
     int leakedDescriptors = 0;  ///< file descriptors that the request left open
@@ -85,7 +85,7 @@ public:
     void unload();
 
     /** Makes a request, optionally with a fault while the provider runs. */
-    Response ask(const Request& request, const Fault* fault = nullptr);
+    ObservedResponse ask(const RequestCase& request, const Fault* fault = nullptr);
 
     /** Returns the current instances of a class without clock values. */
     Lines instancesOf(const std::string& className);
@@ -111,20 +111,20 @@ std::string fileOf(TestEnvironment::Library library);
  * The table contains every supported operation of every class and some unsupported ones.
  */
 ///@{
-const std::vector<Request>& allRequests();
-std::vector<Request> changingRequests();
+const std::vector<RequestCase>& allRequests();
+std::vector<RequestCase> changingRequests();
 
 /** Returns a request of the table; throws std::out_of_range if there is none. */
-const Request& requestNamed(const std::string& name);
+const RequestCase& requestNamed(const std::string& name);
 
 /**
  * Returns a request that restores the file after a failure: it sets a property of the first record to its current
  * value, or modifies the asset data.
  */
-const Request& repairOf(const std::string& dataFile);
+const RequestCase& repairOf(const std::string& dataFile);
 
 /** Returns a change that repairOf() reverts, for libraries that do not write unchanged values. */
-const Request& otherChangeOf(const std::string& dataFile);
+const RequestCase& otherChangeOf(const std::string& dataFile);
 ///@}
 
 /** Returns the class whose instances a data file contains. */

@@ -18,11 +18,11 @@ using testing::AnyOf;
 using testing::IsEmpty;
 using testing::Not;
 
-class VanishingTest : public testing::TestWithParam<std::tuple<TestEnvironment::Library, Request>> {
+class VanishingTest : public testing::TestWithParam<std::tuple<TestEnvironment::Library, RequestCase>> {
 protected:
     VanishingTest() : environment(std::get<0>(GetParam())), expected(runWithoutFaults(environment, request())) {}
 
-    static const Request& request() { return std::get<1>(GetParam()); }
+    static const RequestCase& request() { return std::get<1>(GetParam()); }
     static bool hasGate() { return std::get<0>(GetParam()) == TestEnvironment::Library::gate; }
     const std::string& file() const { return expected.file; }
     fs::path data() const { return environment.dataDirectory(); }
@@ -43,7 +43,7 @@ protected:
             vanish();
         }
         const Fault vanishing = moment == nullptr ? Fault{} : Fault{moment->kind, moment->number, false, 0, vanish};
-        const Response response = environment.ask(request(), moment == nullptr ? nullptr : &vanishing);
+        const ObservedResponse response = environment.ask(request(), moment == nullptr ? nullptr : &vanishing);
         EXPECT_FALSE(response.outcome.threw);
         EXPECT_LE(response.leakedDescriptors, 0) << "only the directory's lock may be closed";
         return response.outcome;
@@ -101,7 +101,7 @@ protected:
     }
 
     void expectServedWithoutDirectory() {
-        const Response response = environment.ask(otherChangeOf(file()));
+        const ObservedResponse response = environment.ask(otherChangeOf(file()));
         EXPECT_EQ(response.outcome.rc, hasGate() ? CMPI_RC_ERR_FAILED : CMPI_RC_OK);
         EXPECT_FALSE(fs::exists(data())) << "it is not created";
     }

@@ -40,7 +40,7 @@ bool isOfResult(const std::string& function) {
 /** Two leases. The requests of these tests do not address the first one. */
 class BrokerFailureTest : public GateTest {
 protected:
-    using Operation = std::function<Outcome()>;
+    using RequestCall = std::function<Outcome()>;
 
     BrokerFailureTest() {
         create("other lease", {named("Lessor", text("First"))});
@@ -48,7 +48,7 @@ protected:
                             named("BaseTermCommencementDate", testsupport::dateTime("20260101000000.000000+060"))});
     }
 
-    std::map<std::string, Operation> operations() {
+    std::map<std::string, RequestCall> requests() {
         const ObjectPath path = keyedPath(lease, secondNode);
         const cimhost::PropertyList list{{"Lessor"}};
         return {
@@ -65,10 +65,10 @@ protected:
         };
     }
 
-    /** Counts the calls of a function in a successful run of the operation, and reverts the operation's changes. */
-    int callsOf(const std::string& function, const Operation& operation) {
+    /** Counts the calls of a function in a successful run of the request, and reverts the request's changes. */
+    int callsOf(const std::string& function, const RequestCall& request) {
         broker.forget();
-        const Outcome outcome = operation();
+        const Outcome outcome = request();
         EXPECT_EQ(outcome.rc, CMPI_RC_OK);
         good = answersOf(outcome);
         const int count = broker.count(function);
@@ -114,20 +114,20 @@ protected:
         EXPECT_THAT(state(), testing::Contains("other lease First")) << what;
     }
 
-    std::vector<std::string> good{};  ///< results of the operation without failures
+    std::vector<std::string> good{};  ///< results of the request without failures
 };
 
 class EachOperationTest : public BrokerFailureTest, public testing::WithParamInterface<const char*> {};
 
 TEST_P(EachOperationTest, ReturnsNoPartialResultIfAnyCallFails) {
-    const Operation operation = operations().at(GetParam());
+    const RequestCall request = requests().at(GetParam());
     const std::vector<std::string> before = state();
     for (const std::string& function : brokerFunctions) {
-        const int calls = callsOf(function, operation);
+        const int calls = callsOf(function, request);
         for (int call = 1; call <= calls; ++call) {
             const std::string what = function + " fails at call " + std::to_string(call);
             broker.failCall(function, call, brokerCode);
-            const Outcome outcome = operation();
+            const Outcome outcome = request();
             broker.cancelFailures();
             expectValidResponse(outcome, what);
             if (outcome.rc == CMPI_RC_OK) {
@@ -145,10 +145,10 @@ TEST_P(EachOperationTest, ReturnsNoPartialResultIfAnyCallFails) {
 }
 
 TEST_P(EachOperationTest, SurvivesFunctionsThatReturnNull) {
-    const Operation operation = operations().at(GetParam());
+    const RequestCall request = requests().at(GetParam());
     for (const std::string& function : brokerFunctions) {
         broker.answerNothingEver(function);
-        const Outcome outcome = operation();
+        const Outcome outcome = request();
         broker.cancelFailures();
         expectValidResponse(outcome, function + " answers nothing");
         restore();
@@ -221,10 +221,10 @@ TEST_F(BrokerFailureTest, CatchesAllExceptionsAndServesTheNextRequest) {
     gate().createAssociationMI(&throwing.broker, nullptr);
     for (const bool isStandard : {false, true}) {
         ThrowingBroker::throwsStandard = isStandard;
-        for (const auto& [name, operation] : operations()) {
+        for (const auto& [name, request] : requests()) {
             for (int call = 1; call <= 3; ++call) {
                 ThrowingBroker::callsUntilThrow = call;
-                const Outcome outcome = operation();
+                const Outcome outcome = request();
                 ThrowingBroker::callsUntilThrow = 0;
                 expectValidResponse(outcome, name);
                 restore();
@@ -244,8 +244,8 @@ TEST_F(BrokerFailureTest, WorksWithBrokersThatSetNoStates) {
         loose.serve("VELKO_ComputerSystem", {testsupport::instance(computerPath("beta"))});
         gate().createInstanceMI(loose.handle(), nullptr);
         gate().createAssociationMI(loose.handle(), nullptr);
-        for (const auto& [name, operation] : operations()) {
-            EXPECT_EQ(operation().rc, CMPI_RC_OK) << name;
+        for (const auto& [name, request] : requests()) {
+            EXPECT_EQ(request().rc, CMPI_RC_OK) << name;
             restore();
         }
         unload();
