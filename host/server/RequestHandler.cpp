@@ -6,6 +6,7 @@ namespace cimhost::server {
 namespace {
 
 constexpr std::chrono::seconds authorizationLifetime{60};
+constexpr std::size_t shortBody = std::size_t{16} << 10U;  ///< most bytes that are read before the request waits
 constexpr unsigned badRequest = 400;
 constexpr unsigned timeout = 408;
 constexpr std::size_t refusedBodyFactor =
@@ -143,11 +144,25 @@ Reply RequestHandler::answer(Exchange& exchange) {
     }
 }
 
+cimxml::Message RequestHandler::read(Exchange& exchange) const {
+    cimxml::XmlLimits limits;
+    limits.depth = settings.limits.xmlDepth;
+    limits.elements = settings.limits.xmlElements;
+    cimxml::Message message = cimxml::readMessage(exchange.body, limits);
+    exchange.body = {};
+    return message;
+}
+
 /**
  * Lists have another quota than short requests, which otherwise would wait for their results. While it waits for the
- * results of others, a list keeps its share.
+ * results of others, a list keeps its share. A short message is read while others run; a long one, which needs more
+ * memory than its body, when it has its share.
  */
 Reply RequestHandler::performWhenFree(Exchange& exchange) {
+    std::optional<cimxml::Message> message;
+    if (exchange.body.size() <= shortBody) {
+        message = read(exchange);
+    }
     const auto latest = std::chrono::steady_clock::now() + settings.limits.queueTime;
     const bool returnsList = cimxml::Operations::returnsList(exchange.headers.method);
     Quota::Share share;
@@ -157,16 +172,11 @@ Reply RequestHandler::performWhenFree(Exchange& exchange) {
     if (returnsList && !exchange.unfinished.take(results, latest)) {
         return unavailable("Other clients have not received their results yet.");
     }
-    return perform(exchange, share);
+    return perform(exchange, message ? *message : read(exchange), share);
 }
 
 /** Releases the share before it writes: while a thread writes, another can perform its request. */
-Reply RequestHandler::perform(Exchange& exchange, Quota::Share& share) {
-    cimxml::XmlLimits limits;
-    limits.depth = settings.limits.xmlDepth;
-    limits.elements = settings.limits.xmlElements;
-    const cimxml::Message message = cimxml::readMessage(exchange.body, limits);
-    exchange.body = {};
+Reply RequestHandler::perform(Exchange& exchange, const cimxml::Message& message, Quota::Share& share) {
     if (auto disagreement = checkAgreement(exchange.headers, message)) {
         return *disagreement;
     }

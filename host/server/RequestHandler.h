@@ -91,7 +91,8 @@ private:
     std::optional<Right> verified(Exchange& exchange, const std::string& authorization);
     Reply answer(Exchange& exchange);
     Reply performWhenFree(Exchange& exchange);
-    Reply perform(Exchange& exchange, Quota::Share& share);
+    cimxml::Message read(Exchange& exchange) const;
+    Reply perform(Exchange& exchange, const cimxml::Message& message, Quota::Share& share);
     cimxml::ResponseText respond(Exchange& exchange, const cimxml::Message& message);
 
     const Settings& settings;
