@@ -39,6 +39,18 @@ void moveAll(std::vector<Result>& source, std::vector<Result>& target) {
     }
 }
 
+/** A list names the properties to change. Others are ignored, even unknown ones; keys identify the instance. */
+void removeUnlisted(Instance& modified, const PropertyList& list) {
+    const auto isIgnored = [&](const NamedValue& each) {
+        const auto isSame = [&](const std::string& name) { return cim::sameName(name, each.name); };
+        return std::none_of(list->begin(), list->end(), isSame) && findNamed(modified.path.keys, each.name) == nullptr;
+    };
+    if (list) {
+        auto& all = modified.properties;
+        all.erase(std::remove_if(all.begin(), all.end(), isIgnored), all.end());
+    }
+}
+
 }  // namespace
 
 Response Operations::send(const Call& call, Request request) const {
@@ -143,10 +155,12 @@ OperationResult Operations::createInstance(const Call& call) {
 }
 
 OperationResult Operations::modifyInstance(const Call& call) {
-    const Instance modified = call.arguments.reader().namedInstance(call.arguments.required("ModifiedInstance"));
+    Instance modified = call.arguments.reader().namedInstance(call.arguments.required("ModifiedInstance"));
     requireKeys(modified.path, call.schema);
     requireProvider(call, modified.path, CMPI_RC_ERR_NOT_SUPPORTED);
-    send(call, Request::modifyInstance(modified.path, modified, call.arguments.strings("PropertyList")));
+    const PropertyList list = call.arguments.strings("PropertyList");
+    removeUnlisted(modified, list);
+    send(call, Request::modifyInstance(modified.path, modified, list));
     return {};
 }
 
