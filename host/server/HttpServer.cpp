@@ -10,8 +10,6 @@
 namespace cimhost::server {
 namespace {
 
-constexpr std::size_t headSize = std::size_t{64} << 10U;  ///< of a request, with its target; also the send buffer
-
 using Response = std::unique_ptr<MHD_Response, decltype(&MHD_destroy_response)>;
 
 /** The text of a response that is sent in blocks. */
@@ -227,7 +225,7 @@ struct HttpServer::Endpoint {
             {MHD_OPTION_LISTEN_SOCKET, socket, nullptr},
             {MHD_OPTION_CONNECTION_LIMIT, static_cast<intptr_t>(server.settings.limits.connections + endingConnections),
              nullptr},
-            {MHD_OPTION_CONNECTION_MEMORY_LIMIT, static_cast<intptr_t>(headSize), nullptr},
+            {MHD_OPTION_CONNECTION_MEMORY_LIMIT, static_cast<intptr_t>(server.settings.limits.headBytes), nullptr},
             {MHD_OPTION_NOTIFY_CONNECTION, reinterpret_cast<intptr_t>(&notifyConnection), this},
             {MHD_OPTION_NOTIFY_COMPLETED, reinterpret_cast<intptr_t>(&notifyCompleted), this},
             {MHD_OPTION_STRICT_FOR_CLIENT, 1, nullptr}};

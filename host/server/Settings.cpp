@@ -36,6 +36,8 @@ void readLimits(TableReader table, Limits& limits) {
     readNumber(table, "running_requests", limits.runningRequests, 10'000);
     readNumber(table, "response_results", limits.responseResults, 1'000'000'000);
     readNumber(table, "request_bytes", limits.requestBytes, std::int64_t{1} << 30U);
+    limits.headBytes = static_cast<std::size_t>(
+        table.number("head_bytes", 4096, 1'048'576).value_or(static_cast<std::int64_t>(limits.headBytes)));
     readNumber(table, "xml_depth", limits.xmlDepth, 200);
     readNumber(table, "xml_elements", limits.xmlElements, 10'000'000);
     readNumber(table, "open_enumerations", limits.enumerations.open, 1'000'000);

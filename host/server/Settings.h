@@ -36,6 +36,7 @@ struct Limits {
     std::size_t runningRequests = 1;          ///< other requests
     std::chrono::seconds queueTime{30};       ///< time that a request waits for running requests
     std::size_t responseResults = 200'000;    ///< of all responses that clients have not received completely
+    std::size_t headBytes = std::size_t{64} << 10U;  ///< of a request; also the most bytes that are sent at once
     std::size_t requestBytes = std::size_t{4} << 20U;
     std::size_t xmlDepth = 64;
     std::size_t xmlElements = 50'000;

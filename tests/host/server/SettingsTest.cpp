@@ -106,6 +106,11 @@ TEST_F(SettingsTest, EachKeyOfTheLimitsSetsItsOwnLimit) {
     }
 }
 
+TEST_F(SettingsTest, TheSizeOfHeadsHasALowerLimit) {
+    EXPECT_EQ(read("[limits]\nhead_bytes = 5000").limits.headBytes, 5000U);
+    EXPECT_THAT(reasonFor("[limits]\nhead_bytes = 100"), HasSubstr("limits.head_bytes must be an integer from 4096"));
+}
+
 TEST_F(SettingsTest, MistakesAreErrors) {
     EXPECT_THAT(reasonFor("[limits]\nconections = 7"), HasSubstr("limits.conections is unknown"));
     EXPECT_THAT(reasonFor("[limits]\nconnections = 0"), HasSubstr("limits.connections must be an integer"));
