@@ -3,7 +3,6 @@
 #include <sys/socket.h>
 
 #include <algorithm>
-#include <string_view>
 #include <utility>
 
 #include "server/Sockets.h"
@@ -96,23 +95,23 @@ void Connection::end(Cause why) {
     }
     cause = why;
     // During the head, the thread of a TLS connection may be sending a refusal.
-    const bool hasSlowHead = current == Phase::idle && headSince != Clock::time_point{} && !tls;
-    if (why == Cause::time && (current == Phase::body || hasSlowHead)) {
-        sendTimeout();
+    const bool lacksRequest =
+        current == Phase::idle && !tls && (why == Cause::time ? headSince != Clock::time_point{} : !isTrusted);
+    if (current == Phase::body || lacksRequest) {
+        sendStatus(why == Cause::time ? "408 Request Timeout" : "503 Service Unavailable");
     }
     ::shutdown(descriptor, SHUT_RDWR);
     changed.notify_all();
 }
 
 /** The thread of the connection only receives in this phase: a TLS session permits another thread to send. */
-void Connection::sendTimeout() const {
-    constexpr std::string_view timeout =
-        "HTTP/1.1 408 Request Timeout\r\nConnection: close\r\nContent-Length: 0\r\n\r\n";
+void Connection::sendStatus(const std::string& status) const {
+    const std::string response = "HTTP/1.1 " + status + "\r\nConnection: close\r\nContent-Length: 0\r\n\r\n";
     if (session != nullptr) {
-        static_cast<void>(::gnutls_record_send(session, timeout.data(), timeout.size()) < 0);
+        static_cast<void>(::gnutls_record_send(session, response.data(), response.size()) < 0);
         static_cast<void>(::gnutls_bye(session, GNUTLS_SHUT_WR));
     } else if (!tls) {
-        static_cast<void>(::send(descriptor, timeout.data(), timeout.size(), MSG_NOSIGNAL | MSG_DONTWAIT) < 0);
+        static_cast<void>(::send(descriptor, response.data(), response.size(), MSG_NOSIGNAL | MSG_DONTWAIT) < 0);
     }
 }
 

@@ -84,7 +84,7 @@ private:
 
     /** Shuts the connection down, so that its thread ends it. */
     void end(Cause why);
-    void sendTimeout() const;
+    void sendStatus(const std::string& status) const;
     bool isOverdue(const Limits& limits, Clock::time_point now);
 
     /** Notes whether the client receives its response. */
@@ -113,7 +113,8 @@ private:
  * All connections. Ends those that exceed a time limit; a client that sends its request too slowly receives 408. If
  * there are too many connections, of one network or altogether, each new one ends another: first those that were
  * refused, then those without an accepted password or request, then those whose body does not arrive, then idle ones,
- * then those that do not receive their response, at last those whose body arrives; of several the oldest.
+ * then those that do not receive their response, at last those whose body arrives; of several the oldest. A client
+ * whose request has not arrived then receives 503, unless an earlier one was served.
  */
 class ConnectionTable {
 public:

@@ -68,6 +68,18 @@ TEST_F(ConnectionTableTest, ANewConnectionEndsTheOldestThatHasNotSentARequest) {
     EXPECT_TRUE(trusted.isOpen());
 }
 
+TEST_F(ConnectionTableTest, AClientThatMakesRoomBeforeItsFirstRequestReceives503) {
+    const Added& silent = addIn(Phase::idle);
+    const Added& sending = addIn(Phase::body);
+    const Added& served = addIn(Phase::idle, true);
+    for (int i = 0; i < 3; ++i) {
+        add().connection->enter(Phase::work);
+    }
+    EXPECT_THAT(silent.sockets.client.receive(), testing::StartsWith("HTTP/1.1 503 "));
+    EXPECT_THAT(sending.sockets.client.receive(), testing::StartsWith("HTTP/1.1 503 "));
+    EXPECT_EQ(served.sockets.client.receive(), "");
+}
+
 TEST_F(ConnectionTableTest, RefusedClientsAreEndedFirst) {
     const Added& silent = addIn(Phase::idle);
     const Added& refused = addIn(Phase::refusal);
