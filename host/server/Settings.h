@@ -31,11 +31,11 @@ struct AccessRules {
 
 struct Limits {
     std::size_t connections = 256;
-    std::size_t connectionsPerAddress = 192;  ///< of one network, see networkOf()
-    std::size_t runningLists = 4;             ///< requests that return lists
-    std::size_t runningRequests = 1;          ///< other requests
-    std::chrono::seconds queueTime{30};       ///< time that a request waits for running requests
-    std::size_t responseResults = 200'000;    ///< of all responses that clients have not received completely
+    std::size_t connectionsPerAddress = 192;         ///< of one network, see networkOf()
+    std::size_t runningLists = 4;                    ///< requests that return lists
+    std::size_t runningRequests = 1;                 ///< other requests
+    std::chrono::seconds queueTime{30};              ///< time that a request waits for running requests
+    std::size_t responseResults = 200'000;           ///< of all responses that clients have not received completely
     std::size_t headBytes = std::size_t{64} << 10U;  ///< of a request; also the most bytes that are sent at once
     std::size_t requestBytes = std::size_t{4} << 20U;
     std::size_t xmlDepth = 64;

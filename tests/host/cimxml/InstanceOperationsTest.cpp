@@ -251,15 +251,17 @@ TEST_F(InstanceOperationsTest, ModificationPassesPropertiesAndList) {
 }
 
 TEST_F(InstanceOperationsTest, ModificationIgnoresPropertiesThatItsListDoesNotName) {
-    const std::string instance = "<INSTANCE CLASSNAME=\"Derived\">"
-                                 "<PROPERTY NAME=\"name\" TYPE=\"string\"><VALUE>a</VALUE></PROPERTY>"
-                                 "<PROPERTY NAME=\"size\" TYPE=\"uint32\"><VALUE>5</VALUE></PROPERTY>"
-                                 "<PROPERTY NAME=\"Unknown\" TYPE=\"string\"><VALUE>x</VALUE></PROPERTY></INSTANCE>";
+    const std::string instance =
+        "<INSTANCE CLASSNAME=\"Derived\">"
+        "<PROPERTY NAME=\"name\" TYPE=\"string\"><VALUE>a</VALUE></PROPERTY>"
+        "<PROPERTY NAME=\"size\" TYPE=\"uint32\"><VALUE>5</VALUE></PROPERTY>"
+        "<PROPERTY NAME=\"Unknown\" TYPE=\"string\"><VALUE>x</VALUE></PROPERTY></INSTANCE>";
     const auto namesSent = [&](const std::string& list) {
         manager.requests.clear();
-        response("ModifyInstance", parameter("ModifiedInstance", "<VALUE.NAMEDINSTANCE>" + instanceName("Derived", "a") +
-                                                                     instance + "</VALUE.NAMEDINSTANCE>") +
-                                       list);
+        response("ModifyInstance",
+                 parameter("ModifiedInstance", "<VALUE.NAMEDINSTANCE>" + instanceName("Derived", "a") + instance +
+                                                   "</VALUE.NAMEDINSTANCE>") +
+                     list);
         std::vector<std::string> names;
         for (const NamedValue& each : manager.requests.at(0).instance.properties) {
             names.push_back(each.name.string());
