@@ -268,9 +268,9 @@ TEST_F(InstanceOperationsTest, ModificationIgnoresPropertiesThatItsListDoesNotNa
         }
         return names;
     };
-    EXPECT_THAT(namesSent(properties({"Size"})), ElementsAre("name", "size"));
-    EXPECT_THAT(namesSent(properties({"Unknown"})), ElementsAre("name", "Unknown"));
-    EXPECT_THAT(namesSent(""), ElementsAre("name", "size", "Unknown"));
+    EXPECT_THAT(namesSent(properties({"Size"})), ElementsAre("Name", "Size"));
+    EXPECT_THAT(namesSent(properties({"Unknown"})), ElementsAre("Name", "Unknown"));
+    EXPECT_THAT(namesSent(""), ElementsAre("Name", "Size", "Unknown"));
 }
 
 TEST_F(InstanceOperationsTest, AModifiedInstanceIsOfTheClassOfItsName) {

@@ -151,10 +151,11 @@ TEST_F(HttpServerTest, AFloodOfSlowReadersLeavesOthersServed) {
     manager.answerWith([](const Request&) { return Response{}; });
     const auto end = std::chrono::steady_clock::now() + 60s;
     std::string response;
-    while (response.empty() && std::chrono::steady_clock::now() < end) {  // until a slow reader makes no progress
+    const auto isServed = [&] { return response.rfind("HTTP/1.1 200 ", 0) == 0; };
+    while (!isServed() && std::chrono::steady_clock::now() < end) {  // until a slow reader makes no progress
         response = served(connect());
     }
-    EXPECT_THAT(response, StartsWith("HTTP/1.1 200 "));
+    EXPECT_TRUE(isServed()) << response;
 }
 
 TEST_F(HttpServerTest, ALongResponseWaitsForSlowReadersUntilTheyAreEnded) {
