@@ -48,7 +48,7 @@ struct OpenEnumeration {
 };
 
 struct EnumerationLimits {
-    std::size_t open = 100;            ///< largest number of open enumerations; a user may have half of them
+    std::size_t open = 100;            ///< largest number of open enumerations; each user can have half of them
     std::size_t results = 200'000;     ///< largest number of unread results of all open enumerations
     std::chrono::seconds timeout{60};  ///< if the client requests none
     std::chrono::seconds longestTimeout{600};
