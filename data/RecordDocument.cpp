@@ -123,7 +123,7 @@ Document readRecords(const std::string& content) {
     std::istringstream stream(content);
     unsigned int count = 0;
     store::extract(stream, count);
-    typename Traits::Unit unit;  // a field that cannot be read keeps its value, as in the provider
+    typename Traits::Unit unit;  // as in the provider, an unreadable field keeps the previous record's value
     Document records = Document::array();
     for (; count > 0; --count) {
         store::readRecord(stream, unit, Traits::fields);
@@ -166,7 +166,7 @@ constexpr RecordClass recordClass(const char* name, const char* fileName) {
     return {name, fileName, names.size(), readRecords<Traits, names>, writeRecords<Traits, names>};
 }
 
-/** Throws ConversionError, which names the first line that differs. */
+/** Throws ConversionError, which names the first different line, if the two contents differ. */
 void requireSameLines(const RecordClass& owner, const std::string& content, const std::string& written) {
     if (content == written) {
         return;
@@ -204,7 +204,7 @@ const RecordClass& recordClassOf(const std::string& name) {
 
 Document documentOf(const RecordClass& owner, const std::string& content) {
     Document document{{"class", owner.name}, {"records", owner.read(content)}};
-    const bool isUnended = content.back() != '\n';  // a file without records may be
+    const bool isUnended = content.back() != '\n';  // a file without records may lack the last line feed
     requireSameLines(owner, content + (isUnended ? "\n" : ""), owner.write(document));
     return document;
 }

@@ -13,7 +13,7 @@ namespace data {
 
 using Document = nlohmann::ordered_json;
 
-/** A document or a record file that cannot be converted without loss. The message names the value. */
+/** Reports a document or a record file that cannot be converted without loss. The message names the value. */
 class ConversionError : public std::runtime_error {
 public:
     using std::runtime_error::runtime_error;
@@ -39,8 +39,8 @@ const RecordClass& recordClassOf(const std::string& name);
 Document documentOf(const RecordClass& owner, const std::string& content);
 
 /**
- * The record file of a document. Throws ConversionError if the document is not valid, or if the provider would read
- * other records from the file.
+ * The content of the record file for a document. Throws ConversionError if the document is not valid, or if the
+ * provider would read different records from the file.
  */
 std::string contentOf(const RecordClass& owner, const Document& document);
 

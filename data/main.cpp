@@ -21,12 +21,12 @@ namespace {
 
 enum ExitStatus {
     exitSuccess = 0,
-    exitFailure = 1,  ///< a file is damaged, cannot be read or written, or the document is refused
+    exitFailure = 1,  ///< a file is damaged, or cannot be read or written, or the document is refused
     exitUsage = 2,    ///< the command line is wrong
     exitInUse = 3     ///< another process uses the data directory, or it cannot be locked
 };
 
-/** The data directory cannot be locked. */
+/** Reports that the data directory cannot be locked. */
 class InUse : public std::runtime_error {
 public:
     using std::runtime_error::runtime_error;
@@ -168,7 +168,7 @@ int run(Command command) {
     return status == exitSuccess ? exitFailure : status;
 }
 
-/** Adds an argument for a class and returns the command. */
+/** Adds a command with a class as its argument, and returns the command. */
 CLI::App* addClassCommand(CLI::App& app, const char* name, const char* description, std::string& className) {
     CLI::App* command = app.add_subcommand(name, description);
     std::vector<std::string> names;

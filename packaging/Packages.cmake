@@ -74,7 +74,7 @@ set(package_of_lease-warranty-report.md lease-warranty-report)
 file(GLOB linked CONFIGURE_DEPENDS RELATIVE ${PROJECT_SOURCE_DIR}/docs ${PROJECT_SOURCE_DIR}/docs/*.md)
 
 # law_install_document(<name> <package> <component>)
-# Adapts a document's links to the directories of the packages. No package contains CONTRIBUTING.md.
+# Installs a document. Adapts its links to the directories of the packages; no package contains CONTRIBUTING.md.
 function(law_install_document name package component)
     set(directory ${CMAKE_INSTALL_DATADIR}/doc/${package})
     set(document ${PROJECT_SOURCE_DIR}/docs/${name})

@@ -15,7 +15,7 @@
 
 namespace cimhost::cimxml {
 
-/** Appends the characters of a simple value; nothing for null, references and embedded instances. */
+/** Appends the characters of a simple value. Appends nothing for null, references and embedded instances. */
 struct CharacterWriter {
     std::string& xml;
 
@@ -44,7 +44,7 @@ struct CharacterWriter {
         }
     }
 
-    /** A real number has a decimal point in CIM-XML, also if its mantissa is an integer. */
+    /** A real number has a decimal point in CIM-XML, even if its mantissa is an integer. */
     static std::string withDecimalPoint(std::string_view digits) {
         const std::string_view mantissa = digits.substr(0, digits.find('e'));
         const bool needsPoint = mantissa.find('.') == std::string_view::npos;

@@ -41,7 +41,7 @@ ClassParts classPartsOf(const OperationArguments& arguments, bool localOnly, boo
     return parts;
 }
 
-/** The direct subclasses of a class, or all; of no class, the top-level classes, or all classes. */
+/** The direct subclasses of a class, or all if deep. Without a class: the top-level classes, or all if deep. */
 Classes enumerated(const Schema& schema, const std::string& superclass, bool deep) {
     Classes found = superclass.empty() ? schema.classes() : schema.subclasses(superclass);
     if (!deep) {
@@ -52,7 +52,7 @@ Classes enumerated(const Schema& schema, const std::string& superclass, bool dee
     return found;
 }
 
-/** Follows the references of association classes from a class to others. */
+/** Finds the association classes that refer to a class, and the classes that they associate with it. */
 class ClassTraversal {
 public:
     ClassTraversal(const Schema& itsSchema, const std::string& itsSource, const AssociationFilter& itsFilter)

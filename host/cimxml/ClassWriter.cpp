@@ -13,7 +13,7 @@ void appendFlag(std::string& xml, std::string_view name, bool value) {
     appendAttribute(xml, name, value ? "true" : "false");
 }
 
-/** The flavors that differ from the defaults of the DTD. */
+/** Appends the flavors that differ from the defaults of the DTD. */
 void appendFlavor(std::string& xml, const Flavor& flavor) {
     if (!flavor.overridable) {
         appendFlag(xml, "OVERRIDABLE", false);
@@ -26,7 +26,7 @@ void appendFlavor(std::string& xml, const Flavor& flavor) {
     }
 }
 
-/** Writes classes and their parts. */
+/** Writes a class and its parts. */
 class ClassWriter {
 public:
     ClassWriter(std::string& itsXml, const Class& itsClass, const ClassParts& itsParts, const ObjectWriter& itsWriter)

@@ -12,7 +12,7 @@ struct ClassParts {
     bool localOnly = true;  ///< only elements that the class declares or overrides
     bool qualifiers = true;
     bool classOrigin = false;
-    PropertyList properties{};  ///< only these; none: all
+    PropertyList properties{};  ///< only these; nullopt: all
 };
 
 /** Appends CLASS. */

@@ -43,7 +43,7 @@ std::string_view trimmed(std::string_view characters) {
                                            : characters.substr(first, characters.find_last_not_of(blanks) + 1 - first);
 }
 
-/** An integer, decimal or hexadecimal with 0x; none for another string. */
+/** Parses a decimal integer, or a hexadecimal one with 0x. Returns none for other strings. */
 std::optional<IntegerLiteral> integerFrom(std::string_view digits) {
     IntegerLiteral integer;
     if (!digits.empty() && (digits.front() == '-' || digits.front() == '+')) {
@@ -113,7 +113,7 @@ CMPIType typeOfElement(const XmlElement& element) {
     return *type;
 }
 
-/** The type of a key value without a class: TYPE, or what VALUETYPE and the characters say. */
+/** The type of a key value of an unknown class: TYPE, or else a type derived from VALUETYPE and the characters. */
 CMPIType typeOfKey(const XmlElement& element) {
     if (element.attribute("TYPE") != nullptr) {
         return typeOfElement(element);
@@ -183,7 +183,7 @@ ObjectPath ElementReader::instanceName(const XmlElement& element, const std::str
                 invalid("A KEYBINDING is empty.");
             }
             addKey(path, attributeOf(each, "NAME"), each.children.front());
-        } else if (known != nullptr && known->keys().size() == 1) {  // The name of a single key may be left out.
+        } else if (known != nullptr && known->keys().size() == 1) {  // The name of a single key may be omitted.
             addKey(path, known->keys().front()->name, each);
         } else {
             invalid("Element " + each.name + " needs a KEYBINDING.");

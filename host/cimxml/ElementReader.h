@@ -10,26 +10,27 @@ namespace cimhost::cimxml {
 
 /**
  * Reads CIM objects from elements of a request. The schema determines the types of values and the letter case of names;
- * for classes and properties that it does not have, the element does.
- * All functions throw CimError with CMPI_RC_ERR_INVALID_PARAMETER for an element that is not of the expected kind, a
- * value that does not fit its type, and a key that the class does not have.
+ * for classes and properties that the schema does not have, the element does.
+ * All functions throw CimError: with CMPI_RC_ERR_TYPE_MISMATCH for a property element that does not match the declared
+ * property, and with CMPI_RC_ERR_INVALID_PARAMETER for other unexpected elements, a value that does not fit its type,
+ * and a key that the class does not have.
  */
 class ElementReader {
 public:
-    /** @param itsNameSpace of paths that have none */
+    /** @param itsNameSpace namespace of paths that have none */
     ElementReader(const Schema& itsSchema, std::string itsNameSpace)
         : schema(itsSchema), nameSpace(std::move(itsNameSpace)) {}
 
-    /** CLASSNAME, INSTANCENAME, or a path with one of them: a path has keys only if it is that of an instance. */
+    /** Reads CLASSNAME, INSTANCENAME, or a path with one of them. Only the path of an instance has keys. */
     ObjectPath path(const XmlElement& element) const;
 
-    /** INSTANCE, with a path of those keys that are among its properties. */
+    /** Reads INSTANCE. The path has the keys that are among the properties and not null. */
     Instance instance(const XmlElement& element) const;
 
-    /** VALUE.NAMEDINSTANCE */
+    /** Reads VALUE.NAMEDINSTANCE. */
     Instance namedInstance(const XmlElement& element) const;
 
-    /** VALUE, VALUE.ARRAY, VALUE.REFERENCE or VALUE.REFARRAY as a value of a type. */
+    /** Reads VALUE, VALUE.ARRAY, VALUE.REFERENCE or VALUE.REFARRAY as a value of a type. */
     Value value(const XmlElement& element, CMPIType type, bool isArray) const;
 
 private:
@@ -48,7 +49,7 @@ private:
  */
 void requireFew(const XmlElement& element);
 
-/** The characters of an element as one value of a simple type. @throws ValueError if they do not fit it */
+/** Converts the characters of an element to a value of a simple type. @throws ValueError if they do not fit the type */
 Scalar scalarFrom(const std::string& characters, CMPIType type);
 
 }  // namespace cimhost::cimxml

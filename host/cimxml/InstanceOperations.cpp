@@ -9,7 +9,7 @@
 namespace cimhost::cimxml {
 namespace {
 
-/** An object path must be that of an instance: each key has a value. */
+/** @throws CimError unless the path has a value for each key of its class */
 void requireKeys(const ObjectPath& path, const Schema& schema) {
     const Class* known = schema.findClass(path.className);
     for (const Property* key : known != nullptr ? known->keys() : std::vector<const Property*>()) {
@@ -39,7 +39,7 @@ void moveAll(std::vector<Result>& source, std::vector<Result>& target) {
     }
 }
 
-/** A list names the properties to change. Others are ignored, even unknown ones; keys identify the instance. */
+/** Removes properties that are not in the list of properties to change. Keeps keys, which identify the instance. */
 void removeUnlisted(Instance& modified, const PropertyList& list) {
     const auto isIgnored = [&](const NamedValue& each) {
         const auto isSame = [&](const std::string& name) { return cim::sameName(name, each.name); };
@@ -66,7 +66,7 @@ Response Operations::send(const Call& call, Request request) const {
     return response;
 }
 
-/** A class of the schema without a provider has no instances, and none can be made. */
+/** @throws CimError for a class of the schema without a provider, which has no instances */
 void Operations::requireProvider(const Call& call, const ObjectPath& path, int code) const {
     const bool isServed =
         call.isInterop || registry.find(path.nameSpace, path.className, InterfaceKind::instance) != nullptr;
@@ -172,7 +172,7 @@ OperationResult Operations::deleteInstance(const Call& call) {
     return {};
 }
 
-/** Providers are called for the association class, of which there must be at least one with a provider. */
+/** Returns no results if no matching association class has a provider. */
 Response Operations::associate(const Call& call, Request request) const {
     const bool isReference = isReferenceOperation(request.operation);
     const auto& wanted = isReference ? request.filter.resultClass : request.filter.associationClass;

@@ -7,7 +7,7 @@
 
 namespace cimhost::cimxml {
 
-/** Names of the interop namespace, by which clients discover the server and its namespaces. */
+/** Names of the interop namespace, which clients use to discover the server and its namespaces. */
 const std::vector<std::string>& interopNameSpaces();
 
 /**

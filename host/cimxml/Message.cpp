@@ -15,7 +15,7 @@ constexpr unsigned badRequest = 400;
     throw RequestRefused(badRequest, "request-not-loosely-valid", why);
 }
 
-/** The only child element of that name. */
+/** The only child element of a name. @throws RequestRefused if there is none, or more than one */
 const XmlElement& onlyChild(const XmlElement& parent, std::string_view name) {
     const XmlElement* child = parent.child(name);
     if (child == nullptr) {
@@ -36,7 +36,7 @@ const std::string& requiredAttribute(const XmlElement& element, std::string_view
     return *value;
 }
 
-/** Accepts versions of a major number, "2.x"; later minor versions are compatible. */
+/** Requires a version with the given major number, such as 2.x: all its minor versions are compatible. */
 void checkVersion(const XmlElement& element, std::string_view attribute, char major, const char* error) {
     const std::string& version = requiredAttribute(element, attribute);
     const bool isKnown = version.size() > 2 && version[0] == major && version[1] == '.' &&

@@ -15,8 +15,8 @@ struct Message {
     std::string protocolVersion{};
     std::string method{};  ///< name of the operation or method
     bool isIntrinsic = true;
-    std::string nameSpace{};                                       ///< as "root/cimv2"
-    std::vector<std::pair<std::string, XmlElement>> parameters{};  ///< an element without name: no value
+    std::string nameSpace{};                                       ///< such as "root/cimv2"
+    std::vector<std::pair<std::string, XmlElement>> parameters{};  ///< without a value: an element without name
     XmlElement target{};                                           ///< of an extrinsic call: CLASSNAME or INSTANCENAME
 
     /** The value of a parameter; null if the parameter is absent or has no value. */
@@ -28,11 +28,11 @@ struct Message {
 
 /**
  * Reads a CIM-XML request message.
- * @throws RequestRefused for anything else, with the HTTP status and CIMError that DSP0200 has for it
+ * @throws RequestRefused for other documents, with the HTTP status and CIMError that DSP0200 defines
  */
 Message readMessage(std::string_view document, const XmlLimits& limits = {});
 
-/** The namespace in a LOCALNAMESPACEPATH, as "root/cimv2". */
+/** The namespace in a LOCALNAMESPACEPATH, such as "root/cimv2". */
 std::string nameSpaceOf(const XmlElement& localNameSpacePath);
 
 }  // namespace cimhost::cimxml

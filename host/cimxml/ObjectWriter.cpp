@@ -36,7 +36,7 @@ bool isWanted(const std::string& name, const InstanceParts& parts) {
            (!parts.properties || isInList(*parts.properties, name));
 }
 
-/** The element of a property. */
+/** The element name of a property. */
 const char* elementOf(const Value& value) {
     return value.type == CMPI_ref ? "PROPERTY.REFERENCE" : value.isArray ? "PROPERTY.ARRAY" : "PROPERTY";
 }
@@ -45,7 +45,7 @@ std::string_view xmlType(CMPIType type) {
     return type == CMPI_instance || type == CMPI_null ? std::string_view("string") : typeName(type);
 }
 
-/** The element of a value. References have their own elements, and null has none. */
+/** The element name of a value; empty for references, which have their own elements, and for null. */
 std::string_view elementOfContent(const Value& value) {
     if (value.isNull) {
         return {};
@@ -71,12 +71,12 @@ void appendStartTagOf(std::string& xml, const NamedValue& property, std::string_
     });
 }
 
-/** References and embedded instances have elements inside of their value. */
+/** Whether a value is neither a reference nor an embedded instance. */
 bool isSimple(const Value& value) {
     return value.type != CMPI_ref && value.type != CMPI_instance;
 }
 
-/** Whether XML can represent a scalar. Checks the objects in it. @throws CimError for them */
+/** Whether XML can represent a scalar. @throws CimError if XML cannot represent an object in the scalar */
 struct ScalarCheck {
     bool operator()(const std::string& string) const { return isRepresentable(string); }
     bool operator()(const DateTime& dateTime) const { return isRepresentable(dateTime.value); }
@@ -97,7 +97,7 @@ struct ScalarCheck {
 
 void requireRepresentable(const Value& value, const std::string& className, const std::string& name) {
     for (const Scalar& scalar : value.elements()) {
-        const auto* string = std::get_if<std::string>(&scalar);  // the usual case, without a call through a table
+        const auto* string = std::get_if<std::string>(&scalar);  // the usual case; faster than std::visit
         if (string != nullptr ? !isRepresentable(*string) : !std::visit(ScalarCheck{}, scalar)) {
             throw CimError(CMPI_RC_ERR_FAILED, std::string("The value of ").append(className).append(".").append(name) +
                                                    " has a character that XML cannot represent.");
@@ -105,14 +105,14 @@ void requireRepresentable(const Value& value, const std::string& className, cons
     }
 }
 
-/** The start tag with the class of the last object, which the next one usually has too. */
+/** Caches the start tag of the last object. The next object usually has the same class. */
 struct ClassTag {
     std::string className{};
     std::string start{};
 
     void append(std::string& xml, std::string_view element, const std::string& itsClassName) {
         if (start.empty() || className != itsClassName) {
-            std::string tag;  // without memory, the last one stays complete
+            std::string tag;  // if memory runs out, the cached tag stays complete
             appendStartTag(tag, element, [&] { appendAttribute(tag, "CLASSNAME", itsClassName); });
             className = itsClassName;
             start = std::move(tag);
@@ -133,7 +133,7 @@ struct ObjectWriter::Tags {
     std::string end{};
     bool isComplete = false;
 
-    /** Makes the tags again unless the last object had the same property or key at this position. */
+    /** Rebuilds the tags unless the last object had the same property or key at this position. */
     template <class Make>
     void update(const NamedValue& named, std::string_view itsOrigin, Make make) {
         const Value& value = named.value;
@@ -240,7 +240,7 @@ void ObjectWriter::appendValue(std::string& xml, const Value& value) const {
     appendContent(xml, value);
 }
 
-/** Appends what is inside the element of the value. */
+/** Appends the content of the value's element. */
 void ObjectWriter::appendContent(std::string& xml, const Value& value) const {
     if (!value.isArray) {
         return appendScalar(xml, value.single);

@@ -24,9 +24,9 @@ enum class ObjectForm {
 
 /** The parts of an instance to write. */
 struct InstanceParts {
-    PropertyList properties{};        ///< only these; none: all
+    PropertyList properties{};        ///< only these; nullopt: all
     const Class* onlyOf = nullptr;    ///< only properties that this class has; null: all
-    const Schema* origins = nullptr;  ///< writes the class origin of properties from this schema; null: none
+    const Schema* origins = nullptr;  ///< source of the class origins of properties; null: write none
 
     bool haveAllProperties() const { return !properties && onlyOf == nullptr; }
 };
@@ -36,7 +36,7 @@ class ObjectWriter {
 public:
     /**
      * @param itsHost      host of paths that have none
-     * @param itsNameSpace of paths that have none
+     * @param itsNameSpace namespace of paths that have none
      */
     ObjectWriter(std::string itsHost, std::string itsNameSpace)
         : host(std::move(itsHost)), nameSpace(std::move(itsNameSpace)) {}
@@ -48,16 +48,16 @@ public:
     void appendInstanceName(std::string& xml, const ObjectPath& path) const;
     void appendInstancePath(std::string& xml, const ObjectPath& path) const;
 
-    /** NAMESPACEPATH with the name of a class: CLASSPATH. */
+    /** Appends CLASSPATH with the default namespace. */
     void appendClassPath(std::string& xml, const std::string& className) const;
 
-    /** VALUE, VALUE.ARRAY, VALUE.REFERENCE or VALUE.REFARRAY; nothing for null. */
+    /** Appends VALUE, VALUE.ARRAY, VALUE.REFERENCE or VALUE.REFARRAY. Appends nothing for null. */
     void appendValue(std::string& xml, const Value& value) const;
 
 private:
     /**
      * The tags around the content of a property or a key. The objects that a thread writes usually have the same
-     * properties and keys in the same order, so it keeps the tags by position.
+     * properties and keys in the same order, so each thread caches the tags by position.
      */
     struct Tags;
 
@@ -75,7 +75,7 @@ private:
 
 /**
  * Checks that XML can represent all strings of a path, or of an instance with the wanted parts.
- * @throws CimError naming class and property
+ * @throws CimError that names the class and the property
  */
 void requireRepresentable(const Instance& instance, const InstanceParts& parts = {});
 void requireRepresentable(const ObjectPath& path);

@@ -74,14 +74,14 @@ void OpenEnumerations::removeExpired(Clock::time_point now) {
     erase(now);
 }
 
-/** Erases expired enumerations, with the mutex locked. */
+/** Erases expired enumerations. The caller holds the mutex. */
 void OpenEnumerations::erase(Clock::time_point now) {
     for (auto each = entries.begin(); each != entries.end();) {
         each = each->second.expires <= now ? entries.erase(each) : std::next(each);
     }
 }
 
-/** Whether a new enumeration may be kept, with the mutex locked. */
+/** Whether the limits permit a new enumeration. The caller holds the mutex. */
 bool OpenEnumerations::hasRoomFor(const OpenEnumeration& added) const {
     std::size_t results = added.cursor.left();
     std::size_t ofSameUser = 0;

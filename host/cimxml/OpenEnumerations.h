@@ -15,7 +15,7 @@
 
 namespace cimhost::cimxml {
 
-/** Results of an operation, and how far a client has read them. */
+/** Results of an operation, with the position up to which the client has read them. */
 struct ResultCursor {
     Response results{};
     ObjectForm form = ObjectForm::instance;
@@ -26,7 +26,7 @@ struct ResultCursor {
     std::size_t size() const { return holdsPaths() ? results.paths.size() : results.instances.size(); }
     std::size_t left() const { return size() - next; }
 
-    /** Appends the next result, and frees it: a client that reads slowly does not hold what it has read. */
+    /** Appends the next result and frees it, so that results that the client has read use no memory. */
     void append(std::string& xml, const ObjectWriter& writer) {
         if (holdsPaths()) {
             const ObjectPath path = std::move(results.paths[next]);
@@ -39,7 +39,7 @@ struct ResultCursor {
     }
 };
 
-/** An enumeration that a client has opened and may continue to pull. */
+/** An enumeration that a client has opened and can continue to pull. */
 struct OpenEnumeration {
     ResultCursor cursor{};
     std::string nameSpace{};
@@ -48,11 +48,11 @@ struct OpenEnumeration {
 };
 
 struct EnumerationLimits {
-    std::size_t open = 100;            ///< enumerations open at the same time; for one user half of them
-    std::size_t results = 200'000;     ///< that all open enumerations have together
-    std::chrono::seconds timeout{60};  ///< if the client asks for no timeout
+    std::size_t open = 100;            ///< largest number of open enumerations; each user can have half of them
+    std::size_t results = 200'000;     ///< largest number of unread results of all open enumerations
+    std::chrono::seconds timeout{60};  ///< if the client requests none
     std::chrono::seconds longestTimeout{600};
-    std::uint32_t mostObjects = 10'000;  ///< of one pull
+    std::uint32_t mostObjects = 10'000;  ///< per open or pull operation
 };
 
 /** The open enumerations of all clients. Safe to use from several threads. */
@@ -63,16 +63,16 @@ public:
     explicit OpenEnumerations(const EnumerationLimits& itsLimits) : limits(itsLimits) {}
 
     /**
-     * Keeps an enumeration until it is taken or the timeout has passed that startTimeout starts.
-     * @param identifier the one that it had before; empty for a new enumeration
+     * Keeps an enumeration until it is taken, or until the timeout that startTimeout() starts has passed.
+     * @param identifier the previous identifier of the enumeration; empty for a new one
      * @return its identifier; none if too many enumerations are open, or they have too many results
      */
     std::optional<std::string> keep(OpenEnumeration enumeration, std::string identifier, Clock::time_point now);
 
-    /** Starts the timeout of an enumeration: the client has received the results before it, or has given up. */
+    /** Starts the timeout of an enumeration. Call when a response with a part of its results was sent or has failed. */
     void startTimeout(const std::string& identifier, Clock::time_point now);
 
-    /** Removes and returns an enumeration; none if the client has no open enumeration of that identifier. */
+    /** Removes and returns an enumeration; none if the client has no open enumeration with that identifier. */
     std::optional<OpenEnumeration> take(const std::string& identifier, const std::string& nameSpace,
                                         const std::string& principal, Clock::time_point now);
 

@@ -14,7 +14,7 @@ namespace {
     throw CimError(CMPI_RC_ERR_INVALID_PARAMETER, "Parameter " + std::string(name) + " " + why + ".");
 }
 
-/** Whether a name is one of several with a space between them. */
+/** Whether a name is in a list of names separated by spaces. */
 bool isOneOf(std::string_view names, std::string_view name) {
     while (!names.empty()) {
         const std::string_view each = names.substr(0, names.find(' '));
@@ -45,7 +45,7 @@ void OperationArguments::requireKnown(std::string_view names) const {
             invalid(name, "is there twice");
         }
         if (isOneOf("LocalOnly DeepInheritance IncludeQualifiers IncludeClassOrigin", name)) {
-            flag(name, false);  // must be a boolean also where the operation ignores it
+            flag(name, false);  // must be a boolean even if the operation ignores it
         }
     }
 }

@@ -12,7 +12,7 @@
 
 namespace cimhost::cimxml {
 
-/** The parameters of an operation by name and type. All throw CimError with CMPI_RC_ERR_INVALID_PARAMETER. */
+/** Reads the parameters of an operation. Throws CimError with CMPI_RC_ERR_INVALID_PARAMETER for a wrong parameter. */
 class OperationArguments {
 public:
     OperationArguments(const Message& itsMessage, const Schema& schema)
@@ -21,7 +21,7 @@ public:
     const std::string& nameSpace() const { return message.nameSpace; }
     const ElementReader& reader() const { return elements; }
 
-    /** Refuses parameters that are there twice or not in a list of names separated by blanks. */
+    /** Refuses repeated parameters, and parameters that are not in a list of names separated by spaces. */
     void requireKnown(std::string_view names) const;
 
     bool has(std::string_view name) const { return message.find(name) != nullptr; }
@@ -34,7 +34,7 @@ public:
     std::string requiredString(std::string_view name) const;
     const XmlElement& required(std::string_view name) const;
     AssociationFilter filter() const;
-    /** An INSTANCENAME or CLASSNAME; longer paths are refused, since the request names the namespace. */
+    /** Reads an INSTANCENAME or CLASSNAME. Refuses longer paths, since the request names the namespace. */
     ObjectPath path(std::string_view name) const;
 
 private:

@@ -170,7 +170,7 @@ const Class& Operations::classOf(const Call& call, const std::string& name) cons
     return *known;
 }
 
-/** The filter of a traversal, whose classes must exist. */
+/** The filter of a traversal. @throws CimError if a class of the filter does not exist */
 AssociationFilter Operations::filterOf(const Call& call) const {
     AssociationFilter filter = call.arguments.filter();
     for (const auto& name : {filter.resultClass, filter.associationClass}) {

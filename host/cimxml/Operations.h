@@ -25,12 +25,12 @@ struct Caller {
     bool mayWrite = true;
 };
 
-/** The results of an operation. The elements are written one by one when they are asked for. */
+/** The results of an operation. Each element is written when next() is called. */
 struct OperationResult {
     std::function<bool(std::string& xml)> next{};  ///< appends an element of IRETURNVALUE; false at the end
     std::string parameters{};                      ///< elements PARAMVALUE
-    std::size_t count = 0;                         ///< of the results, for the access log
-    std::shared_ptr<void> sending{};               ///< released when the response has been sent or given up
+    std::size_t count = 0;                         ///< number of results
+    std::shared_ptr<void> sending{};               ///< released when the response has been sent or has failed
 };
 
 struct OperationsOptions {
@@ -40,8 +40,8 @@ struct OperationsOptions {
 };
 
 /**
- * The CIM operations of the server: those on instances are sent to the object manager, those on classes answered from
- * the schema. Called concurrently. Schema, registry and manager must outlive it.
+ * The CIM operations of the server. Sends operations on instances to the object manager, and answers operations on
+ * classes from the schema. Thread-safe. Schema, registry and manager must outlive this object.
  */
 class Operations {
 public:
@@ -50,21 +50,21 @@ public:
 
     /**
      * Performs the operation of a message.
-     * @throws CimError for an operation that fails, RequestRefused for one that does not exist
+     * @throws CimError for an operation that fails, RequestRefused for an unknown operation
      */
     OperationResult perform(const Message& message, const Caller& caller);
 
-    /** Frees the results of open enumerations whose timeout has passed. To be called from time to time. */
+    /** Frees the results of open enumerations whose timeout has passed. Call periodically. */
     void removeExpired(OpenEnumerations::Clock::time_point now) { enumerations.removeExpired(now); }
 
-    /** Whether an operation returns as many results as there are, or as the client asks for. */
+    /** Whether an operation can return more than one result. */
     static bool returnsList(std::string_view method);
 
-    /** The class that a message is about, for the access log; empty if there is none. */
+    /** The name of the class that a message refers to, for the access log; empty if there is none. */
     static std::string subjectOf(const Message& message);
 
 private:
-    /** A request with the namespace that it is for. */
+    /** A request with the schema and the target of its namespace. */
     struct Call {
         const OperationArguments& arguments;
         const Caller& caller;
@@ -80,7 +80,7 @@ private:
         bool writes;
         Handler handler;  ///< null: not supported
         const char* parameters = nullptr;
-        Operation operation = Operation::enumerateInstances;  ///< of providers
+        Operation operation = Operation::enumerateInstances;  ///< that providers perform
         ObjectForm form = ObjectForm::instance;               ///< of the results
     };
     static const Row rows[];
@@ -128,7 +128,7 @@ private:
     ResultCursor traversal(const Call& call, const ObjectPath& path) const;
     InstanceParts partsOf(const Call& call) const;
 
-    /** A result of which elements are written one by one. */
+    /** A result that writes and frees the objects of the cursor one by one. */
     OperationResult streamed(const Call& call, ResultCursor cursor) const;
 
     const Class& classOf(const Call& call, const std::string& name) const;

@@ -43,7 +43,7 @@ OperationResult Operations::open(const Call& call, ResultCursor cursor) {
     const auto asked = call.arguments.number("OperationTimeout");
     const std::chrono::seconds timeout =
         asked ? std::chrono::seconds(*asked) : std::min(limits.timeout, limits.longestTimeout);
-    if (timeout > limits.longestTimeout || timeout.count() == 0) {  // 0 asks for an enumeration that never times out
+    if (timeout > limits.longestTimeout || timeout.count() == 0) {  // 0 requests an enumeration without timeout
         throw CimError(invalidOperationTimeout, "OperationTimeout must be from 1 to " +
                                                     std::to_string(limits.longestTimeout.count()) + " seconds.");
     }
@@ -74,7 +74,7 @@ OperationResult Operations::part(const Call& call, OpenEnumeration enumeration, 
     return result;
 }
 
-/** Keeps an enumeration of which the timeout starts after a result has been sent. @return its identifier */
+/** Keeps an enumeration. Its timeout starts when the result has been sent. @return its identifier */
 std::string Operations::keep(OpenEnumeration enumeration, const std::string& identifier, OperationResult& result) {
     const auto context = enumerations.keep(std::move(enumeration), identifier, OpenEnumerations::Clock::now());
     if (!context) {

@@ -7,13 +7,13 @@
 
 namespace cimhost::cimxml {
 
-/** The text of a response message, written piece by piece, so that memory holds one piece and not the complete text. */
+/** Writes the text of a response message in pieces, so that memory never holds the complete text. */
 class ResponseText {
 public:
     ResponseText(const Message& request, OperationResult itsResult);
     ResponseText(const Message& request, const CimError& error);
 
-    /** Appends text until the string has that many bytes or the text ends. @return false at the end */
+    /** Appends to a string until it has at least `size` bytes or the text ends. @return false at the end */
     bool append(std::string& text, std::size_t size);
 
     int status() const { return code; }
@@ -21,7 +21,7 @@ public:
 
 private:
     bool isIntrinsic;
-    std::string head;  ///< empty once it is written
+    std::string head;  ///< start of the message; empty after it is written
     OperationResult result;
     int code = 0;
     bool hasEnded = false;

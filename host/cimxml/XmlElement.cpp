@@ -18,7 +18,7 @@ std::string stringOf(const xmlChar* characters) {
     return reinterpret_cast<const char*>(characters);
 }
 
-/** The number of bytes of a start tag. @throws XmlError if it has many attributes */
+/** The length of a start or end tag in bytes. @throws XmlError if it has too many attributes */
 std::size_t lengthOfTag(std::string_view markup) {
     constexpr std::size_t most = 64;
     std::size_t attributes = 0;
@@ -51,7 +51,7 @@ void requireFewAttributes(std::string_view document) {
     }
 }
 
-/** The parser of this thread, for one document: making a parser takes longer than parsing a usual request. */
+/** Uses this thread's parser for one document, since creating a parser takes longer than parsing a usual request. */
 class BorrowedParser {
 public:
     BorrowedParser(xmlSAXHandler events, void* builder) {
@@ -107,9 +107,10 @@ public:
         requireFewAttributes(document);
         const BorrowedParser borrowed(handler(), this);
         parser = borrowed.get();
-        // Without XML_PARSE_NOENT, ampersands of attributes would remain encoded. There are no entities to declare.
+        // Without XML_PARSE_NOENT, ampersands in attributes would remain encoded. It is safe, since document type
+        // declarations, which could declare entities, are refused.
         // A declared encoding such as UTF-7 could hide attributes from requireFewAttributes().
-        // Without XML_PARSE_HUGE, documents of more than 10 MB would be refused, whatever the limit of requests is.
+        // Without XML_PARSE_HUGE, documents of more than 10 MB would be refused, even if the settings permit them.
         xmlCtxtUseOptions(parser, XML_PARSE_NONET | XML_PARSE_NOENT | XML_PARSE_IGNORE_ENC | XML_PARSE_HUGE);
         const int result = xmlParseChunk(parser, document.data(), static_cast<int>(document.size()), 1);
         if (refusal) {
@@ -196,7 +197,7 @@ private:
     xmlParserCtxt* parser = nullptr;
     XmlElement root;
     bool hasRoot = false;
-    std::vector<XmlElement*> open;  ///< from the root to the element that is being read
+    std::vector<XmlElement*> open;  ///< the path from the root to the element that is being read
     std::size_t count = 0;
     std::optional<std::string> refusal;
     int refusedLine = 0;

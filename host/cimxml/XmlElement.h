@@ -9,7 +9,7 @@
 
 namespace cimhost::cimxml {
 
-/** An XML element with its attributes, its child elements and its character data, without the markup between them. */
+/** An XML element with its attributes, its child elements and its character data. */
 struct XmlElement {
     std::string name{};
     std::vector<std::pair<std::string, std::string>> attributes{};
@@ -24,20 +24,19 @@ struct XmlElement {
 };
 
 struct XmlLimits {
-    std::size_t depth = 64;         ///< elements within elements
-    std::size_t elements = 50'000;  ///< elements of a document
+    std::size_t depth = 64;         ///< of nested elements
+    std::size_t elements = 50'000;  ///< in a document
 };
 
-/** A document that is not well-formed, has a document type declaration, many attributes or more than a limit permits.
- */
+/** Reports a document that is not well-formed, has a document type declaration, or exceeds a limit. */
 class XmlError : public std::runtime_error {
 public:
     using std::runtime_error::runtime_error;
 };
 
 /**
- * Parses an XML document in UTF-8; the encoding that it declares is ignored. Only the five predefined entities and
- * character references are expanded; nothing outside of the document is read.
+ * Parses an XML document in UTF-8. Ignores the encoding that the document declares. Expands only the five predefined
+ * entities and character references, and reads nothing outside of the document.
  * @return the root element
  * @throws XmlError with the reason and the line
  */

@@ -22,7 +22,7 @@ const char* entityOf(char character) {
         case '\'':
             return "&apos;";
         case '\r':
-            return "&#13;";  // a parser reads others as line feeds
+            return "&#13;";  // a parser reads an unescaped one as a line feed
         default:
             return nullptr;
     }
@@ -34,7 +34,7 @@ bool isPermitted(const cim::Utf8Character& character) {
            code != 0xFFFF;
 }
 
-/** The bytes that are written as they are: ASCII without control characters and those that are escaped. */
+/** Marks the bytes that are written as they are: printable ASCII except the characters that are escaped. */
 constexpr std::array<bool, 256> makePlain() {
     std::array<bool, 256> plain{};
     for (std::size_t byte = ' '; byte < 0x7F; ++byte) {
@@ -43,7 +43,7 @@ constexpr std::array<bool, 256> makePlain() {
     return plain;
 }
 
-/** Number of leading plain bytes, which nearly all values consist of. */
+/** Number of leading plain bytes. Nearly all values consist of plain bytes only. */
 std::size_t plainLength(std::string_view characters) {
     static constexpr std::array<bool, 256> plain = makePlain();
     std::size_t length = 0;
@@ -53,7 +53,7 @@ std::size_t plainLength(std::string_view characters) {
     return length;
 }
 
-/** Number of leading bytes that are ASCII without control characters. Compares eight at a time. */
+/** Number of leading bytes from 0x20 to 0x7F. Compares eight bytes at once. */
 std::size_t asciiLength(std::string_view characters) {
     constexpr std::uint64_t ones = 0x0101010101010101;
     std::size_t length = 0;

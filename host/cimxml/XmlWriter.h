@@ -7,18 +7,18 @@ namespace cimhost::cimxml {
 
 /**
  * Appends a string as character data or attribute value. Escapes with the five predefined entities, since some clients
- * understand no others, and carriage returns with a character reference. Replaces what XML 1.0 cannot represent by
- * U+FFFD, so that the document is well-formed whatever the string is.
+ * understand no others, and carriage returns with a character reference. Replaces characters that XML 1.0 cannot
+ * represent with U+FFFD, so that the document is always well-formed.
  */
 void appendEscaped(std::string& xml, std::string_view characters);
 
-/** Appends NAME="value" with a blank before it. */
+/** Appends a space and NAME="value". */
 void appendAttribute(std::string& xml, std::string_view name, std::string_view value);
 
-/** Whether XML 1.0 can represent a string: valid UTF-8 without control characters except tab and line ends. */
+/** Whether a string is valid UTF-8 and XML 1.0 can represent all its characters. */
 bool isRepresentable(std::string_view characters);
 
-/** Appends a start tag with the attributes that a function appends. */
+/** Appends a start tag. @param attributes function that appends the attributes */
 template <class Attributes>
 void appendStartTag(std::string& xml, std::string_view name, Attributes&& attributes) {
     xml += '<';
@@ -34,15 +34,15 @@ inline void appendEndTag(std::string& xml, std::string_view name) {
 }
 
 /**
- * An element: writes the start tag, and the end tag when it is destroyed. Elements are never self-closed, since some
- * clients do not understand that.
+ * Writes the start tag of an element when constructed, and the end tag when destroyed. Writes no self-closing tags,
+ * since some clients do not understand them.
  */
 class Element {
 public:
-    /** @param itsName a literal: only the reference is kept */
+    /** @param itsName must outlive this object, like a string literal */
     Element(std::string& itsXml, std::string_view itsName) : Element(itsXml, itsName, [] {}) {}
 
-    /** An element with attributes, which a function appends. */
+    /** @param attributes function that appends the attributes */
     template <class Attributes>
     Element(std::string& itsXml, std::string_view itsName, Attributes&& attributes) : xml(itsXml), name(itsName) {
         appendStartTag(xml, name, attributes);

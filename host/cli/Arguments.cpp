@@ -141,7 +141,7 @@ void addCommand(CLI::App& app, const Command& command, Arguments& arguments) {
     sub->callback([&arguments, &command] { arguments.operation = command.operation; });
 }
 
-/** The names of all commands and options. */
+/** The names of all commands, and of the options that the command line accepts. */
 std::vector<std::string> wordsOf(const CLI::App& app) {
     std::vector<std::string> words;
     for (const CLI::App* command : app.get_subcommands([](const CLI::App*) { return true; })) {

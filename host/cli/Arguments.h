@@ -48,10 +48,10 @@ struct Arguments {
     text::Style style{};  ///< of text on standard output
 };
 
-/** The arguments of a command line, or the output and exit status of a program that ends without a command. */
+/** The arguments of a command line, or the output and exit status of a program that ends without running a command. */
 struct ParsedArguments {
     Arguments arguments{};
-    bool ended = false;    ///< after --help, --version, or an error of the command line
+    bool ended = false;    ///< after --help, --version or a wrong command line
     int exitStatus = 0;    ///< if ended
     std::string output{};  ///< for standard output, if ended
     std::string error{};   ///< for standard error, if ended

@@ -11,7 +11,7 @@ namespace cimhost {
 template <class Target>
 CLI::Option* addChoice(CLI::App& app, const std::string& option, const std::string& description, Target& target,
                        const std::vector<std::pair<std::string, Target>>& choices) {
-    // CLI11 first runs the transformer that was added last. Without descriptions, they do not repeat the names in help.
+    // CLI11 first runs the transformer that was added last. Without descriptions, the help does not repeat the names.
     return app.add_option(option, target, description)
         ->transform(CLI::Transformer(choices).description(""))
         ->transform(CLI::IsMember(choices).description(""));

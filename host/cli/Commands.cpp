@@ -70,7 +70,7 @@ std::string formatted(const std::vector<ObjectPath>& paths, const Arguments& arg
     return arguments.format == Format::json ? json::format(paths) : text::format(paths, arguments.style);
 }
 
-/** The results of an operation in the form that the arguments name. A single result is no list in JSON. */
+/** Formats the results of an operation. In JSON, the result of getting or creating an instance is not a list. */
 std::string formatted(const Response& response, Operation operation, const Arguments& arguments) {
     const bool isJson = arguments.format == Format::json;
     switch (operation) {
@@ -92,7 +92,7 @@ std::string formattedRaw(const Response& response, const Arguments& arguments) {
                                             : text::format(response.providers, arguments.style);
 }
 
-/** The status of the providers: OK also if the object manager maps their results to an error. */
+/** The status of the providers: OK even if the object manager maps their results to an error. */
 Status rawStatus(const Response& response) {
     const auto hasSucceeded = [](const ProviderResponse& each) { return each.status.ok() && each.crashReason.empty(); };
     const bool haveAll = std::all_of(response.providers.begin(), response.providers.end(), hasSucceeded);
@@ -138,7 +138,7 @@ CommandResult runRequest(const Arguments& arguments, const SearchPaths& paths, c
     }
 }
 
-/** All classes of the schema in order, then those that are only registered, each with its providers. */
+/** All classes of the schema, then classes that are only registered, each with its providers. */
 std::vector<ListedClass> listClasses(const Schema& schema, const std::vector<ProviderRegistration>& registrations) {
     std::vector<ListedClass> list;
     for (const Class* each : schema.classes()) {

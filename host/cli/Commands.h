@@ -29,13 +29,13 @@ public:
 
     std::string program = "cimhost";
     std::string introduction{};  ///< first paragraph of the help; empty: that of cimhost
-    std::string examples{};      ///< more lines of examples, each with a line feed
+    std::string examples{};      ///< additional example lines, each with a line feed
     std::string notes{};         ///< a paragraph after the examples, with a line feed; empty: none
 
-    /** Adds options and commands to the command line. They are stored in this object. */
+    /** Adds options and commands to the command line. Their values are stored in this object. */
     virtual void addTo(CLI::App&) {}
 
-    /** Null: the standard behaviour. */
+    /** The behaviour of the object manager; null: the standard behaviour. */
     virtual std::shared_ptr<const ManagerBehaviour> behaviour() const { return nullptr; }
 
     /** Changes a request into one that a client of the emulated manager would send. */
@@ -44,12 +44,12 @@ public:
     /** Whether the command line has a command that the program adds. */
     virtual bool hasCommand() const { return false; }
 
-    /** Runs that command. */
+    /** Runs the command that the program adds. */
     virtual CommandResult run(ObjectManager&, const Arguments&, const Schema&) { return {}; }
 };
 
 /**
- * Runs the command of a command line: loads schema and registrations, performs the request, unloads the providers.
+ * Runs the command of a command line: loads schema and registrations, performs the request and unloads the providers.
  * @throws UsageError, ValueError, PathError for a wrong command line
  * @throws LoadError, LibraryError for files that cannot be loaded
  */

@@ -117,7 +117,7 @@ Json providerJson(const ProviderRegistration& provider) {
             {"unload", stringOrNull(provider.unload)}, {"source", provider.source}};
 }
 
-/** The value of a qualifier of a class or property; null if it has none. */
+/** The value of a qualifier of a class or property; null if the qualifier is absent. */
 template <typename Qualified>
 Json qualifierJson(const Qualified& qualified, const char* name) {
     const Qualifier* qualifier = qualified.findQualifier(name);

@@ -28,7 +28,7 @@ std::string format(const std::vector<Instance>& instances, const Style& style);
 /** One path per line. */
 std::string format(const std::vector<ObjectPath>& paths, const Style& style);
 
-/** Per provider: its status, its results, numbered, and the number of calls of returnDone. */
+/** Per provider: its status, its numbered results, and the number of its calls to returnDone. */
 std::string format(const std::vector<ProviderResponse>& responses, const Style& style);
 
 /** One line per class and provider: class, interfaces, provider, library, namespaces. */
@@ -37,8 +37,8 @@ std::string format(const std::vector<ListedClass>& classes, const Style& style);
 }  // namespace cimhost::text
 
 /**
- * Output for programs: a JSON document with a line feed at the end. Properties and keys are in order; each has its CIM
- * type, whether it is an array, and its value. Bytes that are not UTF-8 become U+FFFD. docs/cimhost.md shows the
+ * Output for programs: a JSON document with a line feed at the end. Properties and keys keep their order; each has its
+ * CIM type, its value, and whether it is an array. Bytes that are not UTF-8 become U+FFFD. docs/cimhost.md shows the
  * format.
  */
 namespace cimhost::json {

@@ -93,7 +93,7 @@ std::vector<NamedValue> readValues(const Arguments& arguments, const ObjectPath&
     return std::move(reader.values);
 }
 
-/** Copies the keys among the properties to the path. The object manager adds those of the path to the properties. */
+/** Copies the keys among the properties to the path. The object manager adds the path's keys to the properties. */
 void joinKeys(Request& request, const Schema& schema) {
     const std::vector<NamedValue>& properties = request.instance.properties;
     const Class* known = schema.findClass(request.path.className);

@@ -7,7 +7,7 @@
 
 namespace cimhost {
 
-/** The command line has values for a class that the schema does not contain. */
+/** Reports that the command line has values for a class that the schema does not contain. */
 class UnknownClass : public std::runtime_error {
 public:
     using std::runtime_error::runtime_error;

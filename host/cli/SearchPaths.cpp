@@ -14,7 +14,7 @@ namespace {
 
 namespace fs = std::filesystem;
 
-/** A kind of files: its name in messages, its option and its environment variable. */
+/** A kind of file: its name in messages, its option, its environment variable and its file name extension. */
 struct Kind {
     const char* name;
     const char* option;
@@ -45,7 +45,7 @@ std::vector<std::string> listFrom(const char* variable) {
     return entries;
 }
 
-/** The entries of the options, or of the variable if there are none. */
+/** The entries of the options, or of the variable if the options have none. */
 std::vector<std::string> configured(const std::vector<std::string>& options, const char* variable) {
     return options.empty() ? listFrom(variable) : options;
 }

@@ -11,16 +11,17 @@ namespace cimhost {
 struct SearchPaths {
     std::vector<std::filesystem::path> schemas{};
     std::vector<std::filesystem::path> registrations{};
-    std::vector<std::filesystem::path> gates{};  ///< registrations that replace others of the same classes
+    std::vector<std::filesystem::path> gates{};  ///< files that replace registrations of the same classes
     std::vector<std::filesystem::path> libraryPaths{};
 };
 
 /**
- * Finds the files of each kind: those of the options, or of the environment variable, or of the installation or build
- * tree. Of a directory, all .mof or .reg files, sorted by name. The gates are in subdirectories "gate" of the
- * directories of registrations; there are none if the option or environment variable for it names the bare provider.
- * @throws UsageError if the environment variable for the provider has an unknown value
- * @throws LoadError if a file or directory does not exist, or if there is no schema or registration
+ * Finds the files of each kind: those of the options, else of the environment variable, else of the installation or
+ * build tree. For a directory, finds all its .mof or .reg files, sorted by name. Finds gates in the subdirectories
+ * "gate" of registration directories, unless --provider, or else CIMHOST_PROVIDER, names the bare provider.
+ * @throws UsageError if CIMHOST_PROVIDER has an unknown value
+ * @throws LoadError if a directory cannot be read, a library directory does not exist, or a schema or registration is
+ * missing
  */
 SearchPaths findSearchPaths(const Arguments& arguments);
 

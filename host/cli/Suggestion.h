@@ -7,8 +7,8 @@
 namespace cimhost {
 
 /**
- * "; did you mean NAME?" with the name that is most similar to a misspelt word, ignoring letter case; an empty string
- * if none is similar.
+ * Returns "; did you mean NAME?" with the name that is most similar to a misspelt word, ignoring letter case. Returns
+ * an empty string if no name is similar.
  */
 std::string didYouMean(std::string_view word, const std::vector<std::string>& names);
 

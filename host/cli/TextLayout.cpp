@@ -44,7 +44,7 @@ const char* codeOf(Role role) {
     }
 }
 
-/** Sets the encoding of the C library to UTF-8, for its lifetime and this thread. */
+/** Sets the encoding of the C library to UTF-8 for this thread, until the object is destroyed. */
 class Utf8Locale {
 public:
     Utf8Locale() : before(uselocale(utf8())) {}
@@ -61,10 +61,10 @@ private:
     locale_t before;
 };
 
-constexpr std::size_t gap = 2;              ///< blanks between columns
+constexpr std::size_t gap = 2;              ///< spaces between columns
 constexpr std::size_t leastLastWidth = 16;  ///< the last column needs at least this width
 
-/** The end of the longest part that fits into the room: after its last blank, if it has one. */
+/** The end of the longest part that fits into the room: after its last space, if it has one. */
 std::size_t endOfPart(const std::string& text, std::size_t begin, std::size_t room) {
     std::size_t afterBlank = begin;
     std::size_t width = 0;
@@ -91,7 +91,7 @@ std::vector<std::string> parts(const std::string& text, std::size_t room) {
     return found;
 }
 
-/** The layout of some rows. */
+/** The layout of rows in aligned columns. */
 class Layout {
 public:
     Layout(const std::vector<Row>& rows, std::string itsIndent, const Style& itsStyle,
@@ -139,7 +139,7 @@ private:
         return lines;
     }
 
-    /** A cell whose further lines begin in the same column. */
+    /** A cell whose continuation lines begin in the same column. */
     std::string below(const Row& row, std::size_t column, std::size_t begins) const {
         const std::size_t room = style.width > begins && begins != 0 ? style.width - begins : 0;
         std::string lines;

@@ -38,8 +38,8 @@ struct Style {
 };
 
 /**
- * The style for a file descriptor. With Colours::automatic, a terminal has colours unless NO_COLOR is set or TERM is
- * "dumb". The width of a terminal is COLUMNS if that is set, otherwise the reported width.
+ * The style for a file descriptor. With Colours::automatic, a terminal has colours unless NO_COLOR is not empty or TERM
+ * is "dumb". The width of a terminal is COLUMNS if that is a positive number, otherwise the reported width.
  */
 Style styleFor(int descriptor, Colours mode);
 
@@ -66,7 +66,7 @@ using Row = std::vector<std::string>;
 /**
  * Aligns the columns of the rows. Lines that exceed the style's width continue below, in the last column; if there is
  * too little space for that, each cell is on a separate line.
- * @param roles of the first columns; the others are plain
+ * @param roles roles of the first columns; other columns are plain
  */
 std::string aligned(const std::vector<Row>& rows, const std::string& indent, const Style& style = {},
                     const std::vector<Role>& roles = {});

@@ -11,7 +11,7 @@
 #include "schema/Errors.h"
 #include "server/Service.h"
 
-// The program cimhost: its commands, and serve.
+// The program cimhost, with the command serve.
 
 namespace cimhost {
 namespace {
@@ -110,7 +110,7 @@ void announce(const std::string& message) {
     std::fflush(stdout);
 }
 
-/** The command serve: a server for clients of the network. */
+/** The command serve, which runs the server. */
 class ServeCommand : public CommandExtension {
 public:
     void addTo(CLI::App& app) override {
@@ -162,10 +162,11 @@ private:
 }  // namespace cimhost
 
 /**
- * Read by jemalloc. With few arenas, the server needs half the memory while it serves several clients, since a request
- * uses what others have freed. Threads still do not wait for each other: each has a cache of free memory. The other
- * option lets small objects use what a large result has freed: by default, they get new memory, and the system has to
- * provide it for each large result again.
+ * Options that jemalloc reads. With few arenas (narenas), the server needs half the memory while it serves several
+ * clients, since a request reuses memory that other requests have freed. Threads still rarely wait for each other,
+ * since each thread caches free memory. lg_extent_max_active_fit lets small objects reuse the memory that a large
+ * result has freed. By default, small objects receive new memory, and the system must provide memory for each large
+ * result again.
  */
 extern "C" [[gnu::visibility("default")]] const char* malloc_conf;
 const char* malloc_conf = "narenas:2,lg_extent_max_active_fit:24";

@@ -16,7 +16,7 @@ int openLog(const std::filesystem::path& file) {
     return ::open(file.c_str(), O_WRONLY | O_APPEND | O_CREAT | O_CLOEXEC | O_NOFOLLOW, 0640);
 }
 
-/** A string of a client as one word: other characters than visible ASCII are escaped. */
+/** Formats a string from a client as one word of visible ASCII characters. Escapes other characters. */
 std::string word(const std::string& string) {
     if (string.empty()) {
         return "-";

@@ -19,7 +19,7 @@ struct AccessRecord {
     std::chrono::microseconds duration{};
 };
 
-/** A record as a line: time, client, user, operation, class, status, number of objects, milliseconds. */
+/** Formats a record as a line: time, client, user, operation, class, statuses, number of objects, milliseconds. */
 std::string formatted(const AccessRecord& record, std::chrono::system_clock::time_point time);
 
 /** Writes lines to a file, or to standard error, which the service manager stores in the journal. */
@@ -31,10 +31,10 @@ public:
     AccessLog(const AccessLog&) = delete;
     AccessLog& operator=(const AccessLog&) = delete;
 
-    /** Opens the file again, after a log rotation. A file that cannot be opened leaves the log as it is. */
+    /** Reopens the file after a log rotation. If it cannot be opened, the log continues to use the old file. */
     void reopen();
 
-    /** Each line is one write, so that concurrent lines do not mix. Lines that cannot be written are dropped. */
+    /** Writes each line with one system call, so that concurrent lines do not mix. Drops lines if writing fails. */
     void write(const AccessRecord& record) const;
     void write(const std::string& message) const;
 

@@ -16,7 +16,7 @@
 namespace cimhost::server {
 namespace {
 
-/** Decodes base 64; none for anything else. */
+/** Decodes Base64. Returns none for other strings. */
 std::optional<std::string> base64Decoded(std::string_view encoded) {
     constexpr std::string_view digits = "ABCDEFGHIJKLMNOPQRSTUVWXYZabcdefghijklmnopqrstuvwxyz0123456789+/";
     if (encoded.size() % 4 != 0) {
@@ -46,7 +46,7 @@ std::optional<std::string> base64Decoded(std::string_view encoded) {
     return decoded;
 }
 
-/** Answers PAM's questions with the password. */
+/** Answers PAM's prompts for hidden input with the password. */
 int answerQuestions(int count, const pam_message** messages, pam_response** responses, void* password) {
     auto* answers = static_cast<pam_response*>(std::calloc(static_cast<std::size_t>(count), sizeof(pam_response)));
     if (answers == nullptr) {
@@ -61,7 +61,7 @@ int answerQuestions(int count, const pam_message** messages, pam_response** resp
     return PAM_SUCCESS;
 }
 
-/** Replaces the delay of PAM modules: the server delays all failures alike. */
+/** Replaces the delay of PAM modules, since the server delays all failures equally. */
 void doNotDelay(int, unsigned, void*) {}
 
 /** One transaction with PAM. */

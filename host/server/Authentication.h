@@ -14,10 +14,10 @@ struct Credentials {
     std::string password{};
 };
 
-/** The credentials in the value of a header Authorization with the scheme Basic; none for any other value. */
+/** The credentials in the value of a header Authorization. None unless the scheme is Basic and the value is valid. */
 std::optional<Credentials> credentialsFrom(const std::string& authorization);
 
-/** Decides whether a password is that of a user. Called by one thread at a time: some PAM modules need that. */
+/** Checks the passwords of users. Called by one thread at a time, since some PAM modules require that. */
 class Authenticator {
 public:
     virtual ~Authenticator() = default;
@@ -29,7 +29,7 @@ public:
 /** Authenticates users of the operating system through a PAM service. */
 class PamAuthenticator : public Authenticator {
 public:
-    /** @param itsDirectory with the file of the service; empty: the system's directory */
+    /** @param itsDirectory directory of the PAM service file; empty: the system's directory */
     explicit PamAuthenticator(std::string itsService, std::filesystem::path itsDirectory = {})
         : service(std::move(itsService)), directory(std::move(itsDirectory)) {}
 

@@ -29,7 +29,7 @@ gnutls_datum_t datum(std::string& content) {
     return {reinterpret_cast<unsigned char*>(content.data()), static_cast<unsigned>(content.size())};
 }
 
-/** Whether the key is that of the certificate. */
+/** Whether the key belongs to the certificate. */
 bool fit(gnutls_pcert_st& certificate, gnutls_privkey_t key) {
     gnutls_pubkey_t ofKey = nullptr;
     gnutls_pubkey_init(&ofKey);

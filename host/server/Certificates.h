@@ -14,23 +14,23 @@ namespace cimhost::server {
 /** The server's certificate chain and key, which can be replaced while connections use them. */
 class Certificates {
 public:
-    /** @throws SettingsError if the files cannot be read or do not fit together */
+    /** @throws SettingsError if the files cannot be read, or the key does not belong to the certificate */
     Certificates(const std::filesystem::path& itsCertificate, const std::filesystem::path& itsKey);
     ~Certificates();
 
-    /** Reads the files again, for new connections. @throws SettingsError; the old certificate then remains */
+    /** Reads the files again, for new connections. @throws SettingsError; the old certificate then remains in use */
     void reload();
 
     struct Chain;
 
-    /** The current chain; it remains valid as long as this object. */
+    /** The current chain, which remains valid as long as this object exists. */
     const Chain& current() const { return *active.load(); }
 
 private:
     std::filesystem::path certificate;
     std::filesystem::path key;
     std::atomic<const Chain*> active{nullptr};
-    std::vector<std::unique_ptr<Chain>> chains;  ///< all that were loaded: handshakes may still use old ones
+    std::vector<std::unique_ptr<Chain>> chains;  ///< all loaded chains, since handshakes can still use old ones
 };
 
 struct Certificates::Chain {

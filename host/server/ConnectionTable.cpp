@@ -10,10 +10,10 @@
 namespace cimhost::server {
 namespace {
 
-/** A client that does not complete a body, or receives no byte of a response, for this time makes no progress. */
+/** A connection is stalled if its body is incomplete, or no byte of its response is acknowledged, for this time. */
 constexpr std::chrono::seconds stalledTime{1};
 
-/** Bytes that are received at most when a client closes its connection: the system counts the end as one. */
+/** Most bytes that the system counts when a client closes its connection: one for the end, more for a TLS alert. */
 constexpr std::uint64_t closureSize = 1;
 constexpr std::uint64_t tlsClosureSize = 64;
 
@@ -55,7 +55,7 @@ void Connection::endHandshake(gnutls_session_t itsSession) {
     enter(Phase::idle);
     const Guard lock(mutex);
     session = itsSession;
-    received -= std::min(received, bytesUnread(descriptor));  // the client may have sent its request already
+    received -= std::min(received, bytesUnread(descriptor));  // the client may already have sent its request
 }
 
 void Connection::trust() {
@@ -94,7 +94,7 @@ void Connection::end(Cause why) {
         return;
     }
     cause = why;
-    // During the head, the thread of a TLS connection may be sending a refusal.
+    // In the idle phase, the thread of a TLS connection may be sending a refusal.
     const bool lacksRequest =
         current == Phase::idle && !tls && (why == Cause::time ? headSince != Clock::time_point{} : !isTrusted);
     if (current == Phase::body || lacksRequest) {
@@ -104,7 +104,7 @@ void Connection::end(Cause why) {
     changed.notify_all();
 }
 
-/** The thread of the connection only receives in this phase: a TLS session permits another thread to send. */
+/** Called while the connection's thread only receives: a TLS session permits another thread to send meanwhile. */
 void Connection::sendStatus(const std::string& status) const {
     const std::string response = "HTTP/1.1 " + status + "\r\nConnection: close\r\nContent-Length: 0\r\n\r\n";
     if (session != nullptr) {
@@ -211,7 +211,7 @@ std::size_t ConnectionTable::busy() const {
                                                   [&](const Connection& each) { return isBusy(each.phase()); }));
 }
 
-/** Number of connections that are not being ended. */
+/** Number of matching connections that are not being ended. */
 std::size_t ConnectionTable::count(const Filter& isCounted) const {
     return static_cast<std::size_t>(std::count_if(connections.begin(), connections.end(), [&](const Connection& each) {
         return isCounted(each) && !each.isEnding();

@@ -25,14 +25,14 @@ struct ClientAddress {
     std::string host() const;
 };
 
-/** A client's connection, and the phase of its current request. Phases are entered by the thread of the connection. */
+/** A client's connection, and the phase of its current request. The connection's thread enters the phases. */
 class Connection {
 public:
     using Clock = std::chrono::steady_clock;
     enum class Phase {
         handshake,  ///< of TLS
-        idle,       ///< no request, or the head of one arrives
-        check,      ///< the head is checked, with its password
+        idle,       ///< no request, or a head arrives
+        check,      ///< the head and its password are checked
         body,       ///< the body arrives
         work,       ///< the operation runs
         response,   ///< the client receives the response
@@ -45,24 +45,24 @@ public:
     bool enter(Phase next);
     Phase phase() const;
 
-    /** Marks a TLS connection as ready for requests. To be called when the client's last message has been read. */
+    /** Marks a TLS connection as ready for requests. Call when the client's last handshake message has been read. */
     void endHandshake(gnutls_session_t itsSession);
 
-    /** Notes that the client has sent a request that was accepted: its connection is ended for new ones later. */
+    /** Records that a password or request was accepted. A trusted connection is ended later for a new one. */
     void trust();
 
     /**
-     * Waits until a time, but not longer than until a condition is true or the connection is ended.
-     * @param isDone its value must be atomic; call wake() after a change
+     * Waits until a time is reached, a condition is true or the connection is ended.
+     * @param isDone condition on atomic variables; call wake() after changing them
      */
     void waitUntil(
         Clock::time_point time, const std::function<bool()>& isDone = [] { return false; });
     void wake();
 
-    /** Whether the table has ended it. */
+    /** Whether the table has ended the connection. */
     bool isEnding() const;
 
-    /** Whether it was ended because the client was too slow. */
+    /** Whether the table has ended the connection because the client was too slow. */
     bool hasTimedOut() const;
 
     /** Whether a part of a head has arrived. */
@@ -87,10 +87,10 @@ private:
     void sendStatus(const std::string& status) const;
     bool isOverdue(const Limits& limits, Clock::time_point now);
 
-    /** Notes whether the client receives its response. */
+    /** Records whether the client has received more bytes of its response. */
     void observe(Clock::time_point now);
 
-    /** Rank and age: the lower, the earlier it is ended for a new connection; none if it is not ended for one. */
+    /** Rank and age. The connection with the lowest is ended first for a new one. None: must not be ended for one. */
     std::optional<std::pair<int, Clock::time_point>> rank(Clock::time_point now) const;
 
     const int descriptor;
@@ -98,23 +98,23 @@ private:
     gnutls_session_t session = nullptr;  ///< of a TLS connection after its handshake
     const ClientAddress origin;
     mutable std::mutex mutex;
-    std::condition_variable changed;  ///< the cause, or what waitUntil() waits for
+    std::condition_variable changed;  ///< the cause, or the condition of waitUntil()
     Cause cause = Cause::none;
     Phase current;
     bool isTrusted = false;
     Clock::time_point since;         ///< when the phase began
-    std::uint64_t received = 0;      ///< bytes received when it began
-    Clock::time_point headSince{};   ///< when the first byte of the head was seen; none before that
+    std::uint64_t received = 0;      ///< bytes received when the idle phase began
+    Clock::time_point headSince{};   ///< when the first byte of the head was seen; zero before that
     std::uint64_t acknowledged = 0;  ///< bytes that the client had acknowledged at `progress`
     Clock::time_point progress;      ///< when the phase began, or bytes of the response were last acknowledged
 };
 
 /**
- * All connections. Ends those that exceed a time limit; a client that sends its request too slowly receives 408. If
- * there are too many connections, of one network or altogether, each new one ends another: first those that were
- * refused, then those without an accepted password or request, then those whose body does not arrive, then idle ones,
- * then those that do not receive their response, at last those whose body arrives; of several the oldest. A client
- * whose request has not arrived then receives 503, unless an earlier one was served.
+ * All connections. Ends those that exceed a time limit; the client receives 408 if its body, or without TLS its head,
+ * arrives too slowly. If there are too many connections, of one network or altogether, each new one ends another: first
+ * those that were refused, then those without an accepted password or request, then those whose body is stalled, then
+ * idle ones, then those whose response is stalled, finally those whose body arrives; in each group the oldest. A client
+ * whose body is incomplete then receives 503, and so does one without TLS that has not sent its first request.
  */
 class ConnectionTable {
 public:
@@ -134,13 +134,13 @@ public:
     /** Marks the TLS connection of a session's socket as ready for requests. */
     void endHandshake(int socket, gnutls_session_t session);
 
-    /** Ends connections that have exceeded their time. To be called several times per second. */
+    /** Ends connections that have exceeded a time limit. Call several times per second. */
     void endOverdue(Connection::Clock::time_point now);
 
-    /** Ends the oldest connection with a client that does not receive its response, if there is one. */
+    /** Ends the oldest connection whose response is stalled, if there is one. */
     void endStalledResponse();
 
-    /** Ends all connections, also those that are added later; those with a running request end after it. */
+    /** Ends all connections, and those that are added later. A running operation completes without a response. */
     void endAll();
 
 private:

@@ -64,7 +64,7 @@ bool isName(const std::string& name) {
     });
 }
 
-/** Refuses a head for which other software could see another end of the request, and so another next request. */
+/** Refuses a head from which a proxy could derive another length of the body (request smuggling). */
 std::optional<HttpResponse> checkFraming(const Headers& headers) {
     const auto isWrong = [](const auto& each) {
         return !isName(each.first) || each.second.find('\r') != std::string::npos ||

@@ -9,10 +9,10 @@
 
 namespace cimhost::server {
 
-/** Headers by name; the names ignore letter case. */
+/** Headers by name. Letter case in names is ignored. */
 using Headers = std::unordered_multimap<std::string, std::string, cim::NameHash, cim::NameEqual>;
 
-/** The value of a header; none if it is absent or there several times. */
+/** The value of a header; none if it is absent or repeated. */
 inline std::optional<std::string> headerIn(const Headers& headers, const std::string& name) {
     const auto [first, end] = headers.equal_range(name);
     return first != end && std::next(first) == end ? std::optional(first->second) : std::nullopt;

@@ -15,7 +15,7 @@ using Response = std::unique_ptr<MHD_Response, decltype(&MHD_destroy_response)>;
 /** The text of a response that is sent in blocks. */
 struct Stream {
     std::shared_ptr<cimxml::ResponseText> source;
-    std::string text;  ///< that is not sent yet
+    std::string text;  ///< written but not sent yet
 };
 
 ssize_t readStream(void* context, std::uint64_t, char* buffer, std::size_t size) {
@@ -39,8 +39,8 @@ Response bufferResponse(const std::string& body) {
 }
 
 /**
- * A short text as it is, with its length; a long one in chunks that are written when they are sent. After a response
- * in chunks, all later ones of the connection have chunks: OpenPegasus' client library expects them.
+ * Sends a short text with its length, and a long one in chunks that are written while they are sent. After a chunked
+ * response, all later responses of the connection are chunked, since OpenPegasus' client library expects that.
  */
 Response textResponse(CimReply reply, Connection& connection) {
     if (reply.isComplete && !connection.usesChunks) {
@@ -89,7 +89,7 @@ struct HttpServer::Endpoint {
 
     Endpoint(HttpServer& itsServer, Listener itsListener) : server(itsServer), listener(std::move(itsListener)) {}
 
-    /** The server for the callbacks of the TLS library, which have no argument for it. One server uses TLS. */
+    /** The server for the callbacks of the TLS library, which have no argument for it. At most one server uses TLS. */
     static std::atomic<HttpServer*> tlsServer;
 
     static int findCertificate(gnutls_session_t session, const gnutls_datum_t*, int, const gnutls_pk_algorithm_t*, int,
@@ -135,7 +135,7 @@ struct HttpServer::Endpoint {
     static void notifyCompleted(void* self, MHD_Connection*, void** context, MHD_RequestTerminationCode code) {
         const std::unique_ptr<Exchange> exchange(static_cast<Exchange*>(*context));
         *context = nullptr;
-        if (exchange == nullptr) {  // there was no memory for it
+        if (exchange == nullptr) {  // out of memory in begin()
             return;
         }
         const auto& server = static_cast<Endpoint*>(self)->server;
@@ -146,10 +146,10 @@ struct HttpServer::Endpoint {
         if (exchange->isBodyIgnored) {
             discardInput(connection.socket(), server.handler.mostIgnored());
         }
-        // Bytes that still arrive belong to the body of this request, not to the head of another.
+        // After the last request, bytes that still arrive are part of its body, not of another head.
         const bool isLast = exchange->isBodyIgnored || code != MHD_REQUEST_TERMINATED_COMPLETED_OK;
         connection.enter(isLast ? Connection::Phase::refusal : Connection::Phase::idle);
-        if (!isLast && server.table.size() == 1) {  // with several, the processors have other work
+        if (!isLast && server.table.size() == 1) {  // with several connections, the processors have other work
             awaitInputBriefly(connection.socket());
         }
     }
@@ -242,7 +242,7 @@ struct HttpServer::Endpoint {
         }
     }
 
-    /** Accepts no more connections. A socket of the service manager remains open for the next process. */
+    /** Stops accepting connections. A socket of the service manager remains usable for the next process. */
     void quiesce() {
         if (daemon != nullptr && !isQuiet) {
             MHD_quiesce_daemon(daemon);

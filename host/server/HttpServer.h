@@ -18,7 +18,7 @@ namespace cimhost::server {
 
 /**
  * Receives requests over HTTP. Each connection has a thread, so that a slow client, a slow provider and the delay after
- * a failed authentication concern one connection only.
+ * a failed authentication affect one connection only.
  */
 class HttpServer {
 public:
@@ -34,13 +34,13 @@ public:
     HttpServer(const HttpServer&) = delete;
     HttpServer& operator=(const HttpServer&) = delete;
 
-    /** The addresses, with the ports that were chosen. */
+    /** The addresses, with the port that the system has chosen instead of port 0. */
     std::vector<Listener> listeners() const;
 
     /**
-     * Accepts no more connections and requests, and waits for the requests that run. After the time, ends the
-     * connections of clients that are still sending or receiving.
-     * @return false if operations still run then
+     * Stops accepting connections and requests, and waits for running requests. If they take longer than the time,
+     * ends all connections.
+     * @return false if operations still run two seconds after that
      */
     bool drain(std::chrono::milliseconds time);
 

@@ -34,7 +34,7 @@ void PasswordQueue::release() {
     passOn();
 }
 
-/** Adds a waiting connection, with the mutex locked like in the functions below. */
+/** Adds a waiting connection. The caller holds the mutex, as for the functions below. */
 void PasswordQueue::add(Waiter& waiter) {
     const std::string& name = waiter.connection.client().network;
     auto network =
@@ -59,7 +59,7 @@ void PasswordQueue::remove(const Waiter& waiter) {
     }
 }
 
-/** Gives the turn to the longest waiting connection of the first network, which is the last one then. */
+/** Gives the slot to the longest waiting connection of the first network. Moves that network to the end. */
 void PasswordQueue::passOn() {
     isTaken = !networks.empty();
     if (!isTaken) {

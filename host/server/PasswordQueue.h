@@ -12,15 +12,15 @@
 namespace cimhost::server {
 
 /**
- * The connections whose passwords are to be checked, one after the other. Client networks take turns, so that one with
- * many connections does not delay the others.
+ * A queue of connections whose passwords are checked one after the other. Client networks take turns, so that a network
+ * with many connections does not delay the others.
  */
 class PasswordQueue {
 public:
-    /** The right to check a password, held until it is destroyed. */
+    /** Holds the right to check a password until the slot is destroyed. */
     class Slot {
     public:
-        /** Waits for it, but not longer than until a time or until the connection is ended. */
+        /** Waits until the slot is available, a time is reached or the connection is ended. */
         Slot(PasswordQueue& itsQueue, Connection& connection, Connection::Clock::time_point latest)
             : queue(itsQueue), acquired(queue.acquire(connection, latest)) {}
         ~Slot() {
@@ -59,7 +59,7 @@ private:
 
     mutable std::mutex mutex;
     bool isTaken = false;
-    std::list<Network> networks;  ///< with waiting connections; the first has the next turn
+    std::list<Network> networks;  ///< networks with waiting connections; the first has the next turn
 };
 
 }  // namespace cimhost::server

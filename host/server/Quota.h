@@ -15,7 +15,7 @@ public:
 
     using Time = std::chrono::steady_clock::time_point;
 
-    /** A part of the amount, held until it is destroyed. Initially nothing. */
+    /** Holds a part of the amount until the share is destroyed. Initially empty. */
     class Share {
     public:
         Share() = default;
@@ -32,7 +32,7 @@ public:
             return quota != nullptr;
         }
 
-        /** Changes the amount without waiting: it may exceed the limit. A share that was not taken stays nothing. */
+        /** Changes the amount without waiting, even beyond the limit. Does not change a share that was not taken. */
         void resize(std::size_t size) {
             if (quota != nullptr) {
                 quota->change(amount, size);
@@ -64,7 +64,7 @@ private:
         --waiting;
         held += isAvailable ? 1 : 0;
         if (isAvailable && waiting != 0 && held < limit) {
-            released.notify_one();  // a release notifies one, but may be enough for several
+            released.notify_one();  // a release notifies one thread, but may suffice for several
         }
         return isAvailable;
     }
@@ -77,7 +77,7 @@ private:
         released.notify_one();
     }
 
-    static constexpr int yields = 2;  ///< before a thread sleeps: most requests end sooner than it could be woken
+    static constexpr int yields = 2;  ///< before a thread sleeps, since waking it takes longer than most requests
     const std::size_t limit;
     mutable std::mutex mutex;
     std::condition_variable released;

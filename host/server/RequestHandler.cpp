@@ -6,11 +6,11 @@ namespace cimhost::server {
 namespace {
 
 constexpr std::chrono::seconds authorizationLifetime{60};
-constexpr std::size_t shortBody = std::size_t{16} << 10U;  ///< most bytes that are read before the request waits
+constexpr std::size_t shortBody = std::size_t{16} << 10U;  ///< largest body that is parsed before the request waits
 constexpr unsigned badRequest = 400;
 constexpr unsigned timeout = 408;
 constexpr std::size_t refusedBodyFactor =
-    4;  ///< multiple of the largest request that is received although it is refused
+    4;  ///< multiple of the largest permitted request that is received and ignored
 
 HttpResponse unauthorized() {
     HttpResponse response = refusal(401, "Send the name and password of a user who may use this server.");
@@ -80,8 +80,8 @@ std::optional<HttpResponse> RequestHandler::authenticate(Exchange& exchange, con
 }
 
 /**
- * Passwords are checked once per connection and minute, since PAM modules take long.
- * @return none if other checks took too long, or the connection was ended before its turn
+ * Checks a password once per connection and minute, since PAM modules are slow.
+ * @return nullopt if other checks took too long, or the connection was ended before its turn
  */
 std::optional<Right> RequestHandler::verified(Exchange& exchange, const std::string& authorization) {
     const Credentials credentials = *credentialsFrom(authorization);
@@ -154,9 +154,9 @@ cimxml::Message RequestHandler::read(Exchange& exchange) const {
 }
 
 /**
- * Lists have another quota than short requests, which otherwise would wait for their results. While it waits for the
- * results of others, a list keeps its share. A short message is read while others run; a long one, which needs more
- * memory than its body, when it has its share.
+ * Lists have a separate quota, so that short requests do not wait for lists. A list keeps its share while it waits
+ * until other clients have received their results. A short message is parsed before it waits for its share; a long one,
+ * which needs more memory than its body, is parsed afterwards.
  */
 Reply RequestHandler::performWhenFree(Exchange& exchange) {
     std::optional<cimxml::Message> message;
@@ -175,7 +175,7 @@ Reply RequestHandler::performWhenFree(Exchange& exchange) {
     return perform(exchange, message ? *message : read(exchange), share);
 }
 
-/** Releases the share before it writes: while a thread writes, another can perform its request. */
+/** Releases the share before it writes the response, so that another request can run meanwhile. */
 Reply RequestHandler::perform(Exchange& exchange, const cimxml::Message& message, Quota::Share& share) {
     if (auto disagreement = checkAgreement(exchange.headers, message)) {
         return *disagreement;

@@ -21,19 +21,19 @@ namespace cimhost::server {
 
 constexpr std::size_t blockSize = std::size_t{32} << 10U;  ///< bytes of a response that are written together
 
-/** One HTTP request and its response, from its head to the end of its response. */
+/** One HTTP request and its response, from the head of the request to the end of the response. */
 struct Exchange {
     HeaderRules rules{};
     Connection* connection = nullptr;
     bool needsAuthentication = true;
     CimHeaders headers{};           ///< of a request that has passed the checks
-    std::string extensionPrefix{};  ///< of the headers of an M-POST request, else empty
+    std::string extensionPrefix{};  ///< of the CIM headers of an M-POST request, else empty
     cimxml::Caller caller{};
-    std::optional<std::uint64_t> length{};  ///< of the body, if a header has it
+    std::optional<std::uint64_t> length{};  ///< of the body, if Content-Length is present
     std::string body{};
-    bool isBodyIgnored = false;             ///< whether the response is sent before the body has arrived
-    std::optional<HttpResponse> refused{};  ///< the response to a body that is too large, once its rest has arrived
-    std::size_t ignored = 0;                ///< bytes of the rest
+    bool isBodyIgnored = false;             ///< whether the response is sent before the complete body is received
+    std::optional<HttpResponse> refused{};  ///< response to a body that is too large; sent after the body
+    std::size_t ignored = 0;                ///< bytes of a body that is too large, after the limit
     Quota::Share unfinished{};              ///< the results of a list that the client has not received completely
     bool isLogged = false;
     AccessRecord record{};
@@ -56,32 +56,32 @@ public:
     RequestHandler(const Settings& itsSettings, cimxml::Operations& itsOperations, Authenticator& itsAuthenticator,
                    const AccessLog& itsLog);
 
-    /** Decides on the head of a request. @return the response that ends it, or none to receive its body */
+    /** Checks the head of a request and its password. @return the response, or none if the body must be received */
     std::optional<HttpResponse> begin(Exchange& exchange, const HttpRequest& request);
 
-    /** Appends a part of the body. @return false if the client sends so much that the connection must end */
+    /** Appends a part of the body. @return false if the body is so large that the connection must end */
     bool receive(Exchange& exchange, const char* data, std::size_t size) const;
 
     /** Performs the complete request. */
     Reply finish(Exchange& exchange);
 
-    /** Largest number of bytes that are received although they are ignored. */
+    /** Largest number of bytes that are received and ignored. */
     std::size_t mostIgnored() const;
 
     /** Writes the access log line. */
     void log(Exchange& exchange, unsigned httpStatus) const;
 
-    /** Writes the line of a request that has ended before its response: because of the client, or of its duration. */
+    /** Writes the line of a request that ended before its response: the client or a time limit ended it. */
     void logIncomplete(Exchange& exchange) const;
     void logIncomplete(const Connection& connection) const;
 
-    /** Whether a response waits until clients have received others. */
+    /** Whether a request waits until clients have received other responses. */
     bool isShortOfResults() const { return results.isAwaited(); }
 
     /** Ends open enumerations whose timeout has passed. */
     void removeExpired() { operations.removeExpired(cimxml::OpenEnumerations::Clock::now()); }
 
-    /** From now on, requests are answered with 503. */
+    /** Answers new requests with 503 from now on. */
     void stop() { stopping = true; }
     bool isStopping() const { return stopping; }
 
@@ -98,11 +98,11 @@ private:
     const Settings& settings;
     cimxml::Operations& operations;
     Authenticator& authenticator;
-    PasswordQueue passwords;  ///< for calls of the authenticator
+    PasswordQueue passwords;  ///< for calls to the authenticator
     const AccessLog& accessLog;
-    Quota requests;  ///< running, except for lists
-    Quota lists;     ///< running
-    Quota results;   ///< of unfinished responses
+    Quota requests;  ///< running requests that do not return lists
+    Quota lists;     ///< running requests that return lists
+    Quota results;   ///< results in unfinished responses
     std::atomic<bool> stopping{false};
 };
 

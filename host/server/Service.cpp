@@ -113,7 +113,7 @@ void serve(const Settings& settings, cimxml::Operations& operations, Authenticat
         }
     }
     if (!stop(*server, settings.limits, log)) {
-        std::_Exit(EXIT_FAILURE);  // the threads of the requests use all of these objects
+        std::_Exit(EXIT_FAILURE);  // running requests use all of these objects
     }
 }
 

@@ -10,15 +10,15 @@
 
 namespace cimhost::server {
 
-/** Blocks the signals that serve() waits for. To be called before any thread is started. */
+/** Blocks the signals that serve() waits for. Call before starting any thread. */
 void blockSignals();
 
 /** The sockets that the service manager has opened; those whose names start with "tls" use TLS. */
 std::vector<Listener> activatedListeners();
 
 /**
- * Serves requests until SIGTERM or SIGINT. SIGHUP reads the certificates again and reopens the access log. Reports its
- * state to the service manager. Operations that still run when the time to stop is over end with the process.
+ * Serves requests until SIGTERM or SIGINT. On SIGHUP, reads the certificates again and reopens the access log. Reports
+ * its state to the service manager. Ends the process if operations still run after the stop time.
  * @param announce receives a line for each address
  * @throws SettingsError
  */

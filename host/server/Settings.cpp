@@ -12,7 +12,7 @@ namespace {
 
 using Agent::TableReader;
 
-/** A problem without its part after the semicolon, which says that the agent ignores it: here it is an error. */
+/** A problem without the part after its last semicolon, which says what the agent does. Here, a problem is an error. */
 std::string causeOf(const std::string& problem) {
     return problem.substr(0, problem.rfind("; "));
 }

@@ -31,18 +31,18 @@ struct AccessRules {
 
 struct Limits {
     std::size_t connections = 256;
-    std::size_t connectionsPerAddress = 192;         ///< of one network, see networkOf()
+    std::size_t connectionsPerAddress = 192;         ///< connections of one network, see networkOf()
     std::size_t runningLists = 4;                    ///< requests that return lists
     std::size_t runningRequests = 1;                 ///< other requests
-    std::chrono::seconds queueTime{30};              ///< time that a request waits for running requests
-    std::size_t responseResults = 200'000;           ///< of all responses that clients have not received completely
-    std::size_t headBytes = std::size_t{64} << 10U;  ///< of a request; also the most bytes that are sent at once
+    std::chrono::seconds queueTime{30};              ///< longest time that a request waits for others
+    std::size_t responseResults = 200'000;           ///< results in responses that clients have not completely received
+    std::size_t headBytes = std::size_t{64} << 10U;  ///< of a request head; also the largest block that is sent at once
     std::size_t requestBytes = std::size_t{4} << 20U;
     std::size_t xmlDepth = 64;
     std::size_t xmlElements = 50'000;
     std::chrono::seconds headTime{10};             ///< from the first byte of a request to the end of its head
     std::chrono::seconds bodyTime{30};             ///< for the body of a request
-    std::chrono::seconds responseTime{300};        ///< until the client has taken the response
+    std::chrono::seconds responseTime{300};        ///< until the client has received the response
     std::chrono::seconds idleTime{600};            ///< of a connection without a request
     std::chrono::seconds stopTime{30};             ///< for running requests when the server stops
     std::chrono::milliseconds failureDelay{2000};  ///< after a failed authentication
@@ -61,7 +61,7 @@ struct Settings {
     Limits limits{};
 };
 
-/** Settings that cannot be used. */
+/** Reports settings that cannot be used. */
 class SettingsError : public std::runtime_error {
 public:
     using std::runtime_error::runtime_error;
@@ -69,11 +69,11 @@ public:
 
 /**
  * Reads a configuration file.
- * @throws SettingsError if it is absent, not TOML, or has a wrong or unknown key
+ * @throws SettingsError if the file is absent, is not TOML, or has an unknown key or a wrong value
  */
 Settings readSettings(const std::filesystem::path& file);
 
-/** @throws SettingsError if a password or unauthenticated access would be open to the network, or TLS has no files */
+/** @throws SettingsError if the network could read passwords or use the server without one, or TLS has no files */
 void checkSettings(const Settings& settings);
 
 }  // namespace cimhost::server

@@ -40,7 +40,7 @@ std::string addressText(const sockaddr* address) {
 }
 
 void requireOpenFiles(std::size_t connections, std::size_t listeners) {
-    constexpr std::size_t others = 256;  // of the server and the providers
+    constexpr std::size_t others = 256;  // other files of the server and the providers
     const std::size_t needed = connections + listeners * endingConnections + others;
     rlimit files{};
     ::getrlimit(RLIMIT_NOFILE, &files);

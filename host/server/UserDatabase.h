@@ -7,10 +7,10 @@
 namespace cimhost::server {
 
 /**
- * Reads an entry of the user database with a function such as getgrgid_r(), and enlarges the buffer for an entry that
- * does not fit: a group may have any number of members.
- * @param read called with the buffer and its size, returns an error number
- * @return false for an error
+ * Reads an entry of the user database with a function such as getgrgid_r(). Enlarges the buffer for an entry that does
+ * not fit, since a group can have any number of members.
+ * @param read is called with the buffer and its size, and returns an error number
+ * @return false if reading fails
  */
 template <class Read>
 bool readEntry(std::vector<char>& buffer, Read read) {

@@ -1,5 +1,5 @@
 # Runs the commands of the object managers, with a time limit and a lock.
-# shellcheck shell=sh disable=SC2154 # the variables are those of the program that sources this file
+# shellcheck shell=sh disable=SC2154 # the program that sources this file sets the variables
 
 has() {
     command -v "$1" >/dev/null 2>&1
@@ -14,8 +14,8 @@ limited() {
     fi
 }
 
-# Shows and runs a command that changes something. Prints its output only when it has ended: if the output cannot be
-# written, a command that writes it directly could end in the middle of its work, or fail.
+# Shows and runs a command that changes something. Prints the command's output only after the command has ended:
+# otherwise, a command that cannot write its output could end in the middle of its work.
 run() {
     if [ "$dry_run" = yes ]; then
         show "would run: $*"
@@ -40,9 +40,9 @@ failure_of() { # STATUS
     esac
 }
 
-# Takes the lock, since concurrent runs would mistake each other's changes for their own. A user without write access
-# to the lock file normally cannot register either; a user with other directories must name another lock file or
-# prevent concurrent runs.
+# Takes the lock, since concurrent runs would mistake each other's changes for their own. Continues without the lock if
+# the lock file is not writable: such a user normally cannot register either. A user who can register in other
+# directories must name another lock file or prevent concurrent runs.
 lock() {
     [ "$dry_run" = no ] && has flock && (umask 077 && : >>"$lock_file") 2>/dev/null || return 0
     exec 9>>"$lock_file"
@@ -60,7 +60,7 @@ on_signal() { # ACTION
     trap "$1" HUP INT QUIT TERM
 }
 
-# Ignores broken pipes, so that a reader that stops reading does not interrupt the work. The commands inherit this.
+# Ignores SIGPIPE, so that the work continues if the reader of the output ends. The commands inherit this.
 ignore_broken_pipes() {
     trap '' PIPE
 }

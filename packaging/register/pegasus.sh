@@ -1,13 +1,14 @@
 # Registers with OpenPegasus, whose server must run.
-# shellcheck shell=sh disable=SC2034,SC2154 # the variables are those of the program that sources this file
+# shellcheck shell=sh disable=SC2034,SC2154 # the program that sources this file sets the variables, or uses them
 
 find_pegasus() {
     has cimprovider || has cimmof || has cimserver
 }
 
-# OpenPegasus removes registrations only through its server, and keeps an old registration if a new one is loaded.
-# cimmofl, which writes to the repository of a stopped server, is not used: without the server the registrations
-# cannot be read, so an old one would stay, and a server that does not respond may still be writing to the repository.
+# Checks that the server responds. OpenPegasus removes registrations only through its server, and keeps an old
+# registration if a new one is loaded. cimmofl, which writes to the repository of a stopped server, is not used:
+# without the server, the registrations cannot be read, so that an old one would remain, and a server that does not
+# respond may still be writing to the repository.
 pegasus_server() {
     for tool in cimmof cimprovider; do
         has "$tool" || {
@@ -44,8 +45,8 @@ pegasus_unknown() {
     failed "OpenPegasus: the server does not list its registrations"
 }
 
-# Finds the namespace of the registrations, which differs between builds. Queries it, because cimmof would create a
-# missing namespace.
+# Sets `interop` to the namespace of the registrations, which differs between builds. Queries the namespace first,
+# because cimmof would create a missing one.
 pegasus_find_interop() {
     candidates=${interop:-root/PG_InterOp root/interop interop}
     for interop in $candidates; do
@@ -61,8 +62,8 @@ pegasus_has_class() { # NAMESPACE CLASS
     limited cimcli gc -n "$1" "$2" >/dev/null 2>&1
 }
 
-# Sets `others` to whether another agent's provider serves computers; yes if that is unknown. Their class is not
-# changed then.
+# Sets `others` to whether another agent's provider serves computers; yes if that is unknown. If yes, the class of
+# computers is not changed.
 pegasus_find_other_computers() {
     others=yes
     if has_computers || pegasus_modules | grep -qx "$(modules_in "$data/pegasus/$computers.mof")"; then
@@ -93,8 +94,8 @@ pegasus_load_classes() {
     done
 }
 
-# Associations refer to computers. Declares their class if it is missing, without changing one that another agent may
-# have declared.
+# Declares the class of computers if it is missing, since associations refer to it. Does not change a class that
+# another agent may have declared.
 pegasus_declare_computers() {
     for class in $(classes_of "$computers"); do
         if has cimcli && pegasus_has_class "$namespace" "$class"; then
@@ -162,7 +163,7 @@ pegasus_look_for_library() {
     esac
 }
 
-# Prints the module of computers under their former name if the agent still has that provider.
+# Prints the module of the provider of computers under its former name, if the agent still has that provider.
 pegasus_former_computers() { # FORMER
     ! has_former_computers || printf '%s\n' "$1" | sed -n "s/ $former_computers\$//p"
 }

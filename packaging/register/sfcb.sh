@@ -1,5 +1,5 @@
-# Registers with SFCB. Its commands change files, so the server may be stopped.
-# shellcheck shell=sh disable=SC2034,SC2154 # the variables are those of the program that sources this file
+# Registers with SFCB. Its commands change files, so the server need not run.
+# shellcheck shell=sh disable=SC2034,SC2154 # the program that sources this file sets the variables, or uses them
 
 find_sfcb() {
     has sfcbrepos || has sfcbstage || has sfcbd
@@ -15,7 +15,7 @@ sfcb_tools() {
     sfcb_find_directory
 }
 
-# Sets the directory of stage and registration; without an option, to the default of SFCB's own command.
+# Sets the directory that contains stage and registration: that of the option, or else the default of sfcbrepos.
 sfcb_find_directory() {
     sfcb_base=$sfcb_directory
     if [ -z "$sfcb_base" ] && has sfcbrepos; then
@@ -48,8 +48,8 @@ sfcb_registrations() {
     fi
 }
 
-# Prints the staged registration of computers under their former name. Other software may have a registration with
-# that name.
+# Prints the name of the staged registration file of computers under their former name, unless it is the file of other
+# software.
 sfcb_former_registration() {
     file=$sfcb_base/stage/regs/$former_computers.reg
     if grep -qs '^ *group: LeaseAndWarranty$' "$file"; then
@@ -66,7 +66,7 @@ sfcb_unstage_all() {
     sfcb_is_unstaged
 }
 
-# Checks the stage, because the command succeeds even if it cannot delete a file.
+# Checks the stage, because sfcbunstage succeeds even if it cannot delete a file.
 sfcb_is_unstaged() {
     [ "$dry_run" = no ] || return 0
     for each in $(sfcb_registrations | sed 's|^|regs/|') $(our_classes | sed "s|.*|mofs/$namespace/&.mof|"); do
@@ -86,10 +86,10 @@ sfcb_register_all() {
     fi
 }
 
-# Copies stage and registration. The copies are in the same file system as the originals, unless those are links, so
-# that renaming restores them and needs no space. SFCB's commands run in the directory of the copies, which has no MOF
-# files: the compiler looks for the files that the CIM schema includes, such as qualifiers.mof, in the current
-# directory first.
+# Copies stage and registration. The copies are in the same file system as the originals, unless the originals are
+# links, so that renaming restores them and needs no space. SFCB's commands run in the directory of the copies, which
+# has no MOF files, because the compiler first looks in the current directory for the files that the CIM schema
+# includes, such as qualifiers.mof.
 sfcb_save() {
     [ "$dry_run" = no ] || return 0
     if ! sfcb_copies=$(mktemp -d "$sfcb_base/before-$program.XXXXXX") || ! cd "$sfcb_copies"; then
@@ -112,7 +112,7 @@ sfcb_abandon() { # REASON
     complain "SFCB: nothing was changed: $1"
 }
 
-# Deletes the copies. Ignores signals, so that none finds them incomplete.
+# Deletes the copies. Ignores signals meanwhile, because their handler would restore incomplete copies.
 sfcb_discard() {
     [ "$dry_run" = no ] || return 0
     on_signal ''
@@ -134,7 +134,7 @@ sfcb_restore() {
     fi
 }
 
-# Restores a directory; a link stays a link.
+# Restores a directory. If the directory is a link, restores the target of the link.
 sfcb_restore_one() { # DIRECTORY
     original=$(readlink -f "$sfcb_base/$1") || return 1
     if [ -e "$original" ]; then
@@ -154,7 +154,7 @@ sfcb_change() { # STEP
     return 1
 }
 
-# Restarts SFCB on request. SFCB reads its repository only when it starts, and may be stopped.
+# Restarts a running SFCB if --restart is given, because SFCB reads its repository only when it starts.
 sfcb_restart() {
     for unit in sblim-sfcb sfcb sfcbd; do
         if has systemctl && systemctl --quiet is-active "$unit" 2>/dev/null; then
@@ -175,8 +175,8 @@ sfcb_setting() { # NAME
     [ -r "$sfcb_config" ] && sed -n "s/^[[:space:]]*$1:[[:space:]]*//p" "$sfcb_config" | tail -n 1
 }
 
-# Warns if SFCB may not find the library. SFCB searches the directories in its configuration, by default among others
-# cmpi below the directory of its libraries.
+# Warns if SFCB might not find the library. SFCB searches the directories that its configuration names. By default,
+# these include the directory cmpi below that of SFCB's libraries.
 sfcb_check_library() {
     directories=$(sfcb_setting providerDirs) || {
         say "SFCB may not find the library: $sfcb_config cannot be read; its line providerDirs must contain $libraries"
@@ -194,14 +194,14 @@ sfcb_check_library() {
     esac
 }
 
-# Warns if SFCB trims values, as it does by default. It treats the bytes of non-ASCII characters as white space, and
-# clients see success.
+# Warns if SFCB trims values, as it does by default. SFCB treats the bytes of non-ASCII characters as white space, and
+# reports success to clients.
 sfcb_check_trimming() {
     sfcb_setting trimWhitespace | grep -qixE 'false([[:space:]].*)?' ||
         say "SFCB trims values, also non-ASCII characters at their ends, unless $sfcb_config has trimWhitespace: false"
 }
 
-# Prints class and provider of each stanza on the standard input.
+# Reads stanzas from standard input. Prints class and provider of each.
 sfcb_stanzas() {
     awk '/^[ \t]*\[/ { class = $0; gsub(/[][ \t\r]/, "", class) }
          tolower($1) == "provider:" { print class, $2 }'
@@ -215,7 +215,7 @@ sfcb_registered() {
     done
 }
 
-# Sets `others` to whether another agent's provider serves computers. Its staged files are not changed then.
+# Sets `others` to whether another agent's provider serves computers. If yes, its staged files are not changed.
 sfcb_find_other_computers() {
     others=no
     has_computers && return

@@ -1,8 +1,8 @@
 # Checks through the object manager that the classes are served.
-# shellcheck shell=sh disable=SC2154 # the variables are those of the program that sources this file
+# shellcheck shell=sh disable=SC2154 # the program that sources this file sets the variables
 
-# Classes that always have an instance if they are served. For a class without provider, object managers return an
-# empty success.
+# Classes that always have an instance if they are served. For a class without a provider, object managers return
+# success without instances.
 never_empty="VELKO_OstrelAgent VELKO_AssetIDDetails VELKO_ComputerSystem"
 
 # Splits the URL into the options of clients: scheme, server (host and port), user, password.
@@ -36,7 +36,7 @@ ask_pywbemcli() {
     limited pywbemcli --server "$scheme://$server" "$@"
 }
 
-# This client accepts any certificate, and its default is the best way to reach a server on this machine.
+# cimcli accepts any certificate. Its default connection, used without --url, is best for a server on this machine.
 ask_cimcli() {
     set -- -n "$namespace" "$1"
     [ -z "$user" ] || set -- -u "$user" -p "$password" "$@"
@@ -57,8 +57,8 @@ is_local() {
     esac
 }
 
-# Prints the classes that are registered on this machine; fails if they are unknown. If both object managers are
-# installed, it is unknown which one responds, so the classes are known only if both have the same.
+# Prints the classes that are registered on this machine. Fails if they are unknown. If both object managers are
+# installed, it is unknown which one responds, so the classes are known only if both have the same classes.
 registered_classes() {
     is_local || return 1
     with_sfcb='' with_pegasus=''
