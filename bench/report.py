@@ -177,7 +177,7 @@ def limits_of(cases, results):
                      "the record layout, and one allocation per longer string", False)
                for class_name, size, one in memories(results) if size == 10000]
     limits += [Limit("Gate, enumerating 1,000 leases: added time in percent", 100 * gated, 5,
-                     "the response is complete before it is returned"),
+                     "collecting the complete response before it is returned"),
                Limit("The same in instructions", 100 * counted_part, 5, "the same"),
                Limit("Gate, getting one of 10 leases: added microseconds", added / 1e3, 10,
                      "its lock and its objects")]
