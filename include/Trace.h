@@ -10,7 +10,7 @@
 #include "TraceFormat.h"
 
 /**
- * Tracing of the provider's functions. Never throws: a line that cannot be written is dropped.
+ * Tracing of the provider's functions. Tracing never throws: a line that cannot be written is dropped.
  *
  * A source file defines a TraceSource named `traceSource` with its logger and file name. A function then traces its
  * entry and its exit with its first statement:
@@ -118,8 +118,8 @@ void traceLine(const CallSite& site, MessageType type, const Parts&... parts) no
 }
 
 /**
- * Traces a function's entry when constructed and its exit when destroyed, unless an exception leaves the function. Both
- * lines have the line number of the constructor call. The parts are labels and values; the exit line contains the
+ * Traces a function's entry when constructed. Traces its exit when destroyed, unless an exception leaves the function.
+ * Both lines have the line number of the constructor call. The parts are labels and values; the exit line contains the
  * current values of variables.
  */
 template <class... Parts>
@@ -243,7 +243,7 @@ constexpr unsigned int exitRuleLine = 349;
 
 }  // namespace KO
 
-/** Logger names that the agent's log filters select by. */
+/** Names of the provider's loggers, for which the agent's configuration sets levels. */
 namespace KO::LeaseWarrantyProvider::LoggerNames {
 
 /** Logger of all translation units except those that use `shortened`. */

@@ -8,7 +8,7 @@
 
 /**
  * Formatting of trace lines. Each formatting function has one buffer for all its calls: a result is valid until the
- * next call of the same function. Strings are truncated at 511 characters.
+ * next call to the same function. Strings are truncated at 511 bytes.
  *
  * The functions are static, so that each translation unit has separate copies and buffers.
  */

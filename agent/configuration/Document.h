@@ -21,7 +21,7 @@ public:
 
     /**
      * Reads the configuration file of this process: the one that OSTREL_CONFIG names, else /etc/ostrel/agent.toml. A
-     * process that runs with another user's privileges ignores the variable.
+     * process that has more privileges than its caller ignores the variable.
      */
     static Document readDefault();
 

@@ -27,8 +27,7 @@ public:
         path.copy(address.sun_path, sizeof address.sun_path - 1);
     }
 
-    /** Sends without a connection, so that it also works after a restart of the service. @return whether it succeeded
-     */
+    /** Sends without a connection, so that the service can be restarted. @return whether the datagram was sent */
     bool send(const std::string& content) const {
         return ::sendto(descriptor.get(), content.data(), content.size(), MSG_NOSIGNAL | MSG_DONTWAIT,
                         reinterpret_cast<const sockaddr*>(&address), sizeof address) >= 0;
