@@ -28,7 +28,7 @@ constexpr std::array<PairProperties, A::pairCount> pairProperties{{
     {"PersonalizedLabel5", "PersonalizedData5"},
 }};
 
-/** Sets all ten properties of the pairs, or none unless there are exactly five pairs. */
+/** Sets all ten properties of the pairs. Sets none if there are not exactly five pairs. */
 void fillPairs(const A& details, InstanceBuilder& builder, const char*) {
     std::vector<A::PersonalizedPair> pairs;
     if (!details.getPersonalizedData(pairs) || pairs.size() != pairProperties.size()) {
@@ -42,7 +42,7 @@ void fillPairs(const A& details, InstanceBuilder& builder, const char*) {
     }
 }
 
-/** Replaces the string by the property's value if the instance has the property. */
+/** Replaces the string with the property's value if the instance has the property. */
 void takeText(const CMPIInstance* instance, const char* name, std::string& text) {
     std::string value;
     if (ProviderUtilities::getProperty(instance, name, value, false)) {
@@ -50,7 +50,7 @@ void takeText(const CMPIInstance* instance, const char* name, std::string& text)
     }
 }
 
-/** Sets all five pairs. A label or data property that the instance lacks repeats the preceding one. */
+/** Sets all five pairs. For a label or data property that the instance lacks, repeats that of the preceding pair. */
 void modifyPairs(A& details, const CMPIInstance* instance) {
     std::string label;
     std::string data;

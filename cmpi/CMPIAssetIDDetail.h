@@ -22,8 +22,8 @@ struct AssetAdapterTraits {
     static const std::array<PropertyRow<AssetIDDetails>, 24> properties;
 
     /**
-     * Sets the modifiable properties that the instance has and writes the asset file. Writes it even if it could not be
-     * read or the path's keys select no computer.
+     * Sets the modifiable properties that the instance has and writes the asset file. Writes the file even if it could
+     * not be read, or if the path's keys select no computer.
      */
     static void modify(AssetIDDetails& details, const CMPIInstance* instance);
 };

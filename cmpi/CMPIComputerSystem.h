@@ -24,7 +24,7 @@ public:
      * Enumerates the instances of the path's class in its namespace, ignoring its keys, and makes the first one
      * current. If that element is not an instance, there is no current instance. Does not call the broker if the path
      * is null.
-     * @throws ProviderException if the path is null, the enumeration fails or has no element
+     * @throws ProviderException if the path is null, or if the enumeration fails or has no element
      */
     void setObjectPath(const CMPIObjectPath* path);
 
@@ -37,7 +37,7 @@ public:
     /** Moves to the next instance. If getNext fails, there is no current instance. */
     void operator++();
 
-    /** Returns the path of the current instance; null if there is none or it does not return its path. */
+    /** Returns the path of the current instance; null if there is no instance, or if it does not return its path. */
     CMPIObjectPath* getObjectPath();
 
     /** Returns the current instance with all properties; null if there is none. */

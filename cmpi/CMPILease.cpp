@@ -10,7 +10,7 @@ const TraceSource LeaseAdapterTraits::traceSource{loggerCMPILease, "CMPILease.cp
 
 using L = Lease;
 
-/** In the order in which instances are filled. */
+/** The properties, in the order in which instances are filled. */
 const std::array<PropertyRow<L>, 18> LeaseAdapterTraits::properties{{
     readOnly<L, &L::getCaption>("Caption"),
     readOnly<L, &L::getDescription>("Description"),

@@ -10,7 +10,7 @@ const TraceSource WarrantyAdapterTraits::traceSource{loggerCMPIWarranty, "CMPIWa
 
 using W = Warranty;
 
-/** In the order in which instances are filled. */
+/** The properties, in the order in which instances are filled. */
 const std::array<PropertyRow<W>, 9> WarrantyAdapterTraits::properties{{
     readOnly<W, &W::getCaption>("Caption"),
     readOnly<W, &W::getDescription>("Description"),

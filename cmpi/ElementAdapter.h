@@ -7,7 +7,7 @@
 namespace KO::LeaseWarrantyProvider {
 
 /**
- * Base of RecordAdapter and ProductAdapter: owns the managed element and has the element's position.
+ * Base of RecordAdapter and ProductAdapter. Owns the managed element, whose current object is the current instance.
  *
  * Adapter is the derived class. Its narrow(element, path) sets the element's filters from the path's keys; its
  * getObjectPath() returns the path of the current instance.

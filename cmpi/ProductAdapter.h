@@ -48,7 +48,7 @@ struct KeyFilter {
 template <class Traits>
 class ProductAdapter : public ElementAdapter<ProductAdapter<Traits>, Traits> {
 public:
-    /** A path selects the instances that match its keys, or all if it has none. */
+    /** A path selects the instances that match its keys, or all instances if it has no keys. */
     using ElementAdapter<ProductAdapter, Traits>::ElementAdapter;
 
     /**

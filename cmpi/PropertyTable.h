@@ -7,7 +7,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-/** An instance that is being filled from an element. All string properties share the string. */
+/** An instance that is being filled from an element. All string properties are read into the same string. */
 struct InstanceBuilder {
     const CMPIBroker* broker;
     CMPIInstance* instance;
@@ -15,8 +15,8 @@ struct InstanceBuilder {
 };
 
 /**
- * A property of a CIM class. Instances are filled in the order of a class's rows; modifications use the same order
- * where modify is set.
+ * A property of a CIM class. Instances are filled in the order of a class's rows. Modifications are applied in the same
+ * order, by the rows that have a modify function.
  */
 template <class Element>
 struct PropertyRow {
@@ -25,18 +25,21 @@ struct PropertyRow {
     /** Sets the instance's property from the element. */
     void (*fill)(const Element& element, InstanceBuilder& builder, const char* name);
 
-    /** Changes the element from the instance if the instance has the property. Null if this row cannot modify. */
+    /** Sets the element's value if the instance has the property. Null for a row that does not modify the element. */
     void (*modify)(Element& element, const CMPIInstance* instance, const char* name);
 };
 
-/** Type under which a property is set: the type of the getter's value, or string or datetime. */
+/** CIM type of a property: the type of the getter's value, or string or datetime. */
 enum class ValueForm {
     typed,     ///< string, number or flag
     text,      ///< string that is not a datetime
     dateTime,  ///< datetime, read and written as a CIM datetime string
 };
 
-/** When to set a property. `always` sets it even if the getter returns false, to the string's previous value. */
+/**
+ * When to set a property. `always` sets it even if the getter returns false. The property then has the value of the
+ * string property before it.
+ */
 enum class Presence {
     ifAvailable,
     always,

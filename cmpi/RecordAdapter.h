@@ -22,13 +22,16 @@ template <class Traits>
 class RecordAdapter : public ElementAdapter<RecordAdapter<Traits>, Traits> {
 public:
     /**
-     * A namespace selects all records, for CreateInstance and for the ends of associations. A path selects the record
-     * with its key, or all records if it has no readable key. The destructor writes the data file if anything changed,
-     * and may throw.
+     * The constructor with a namespace selects all records, for CreateInstance and for the ends of associations. The
+     * constructor with a path selects the record with the path's key, or all records if the path has no readable key.
+     * The destructor writes the data file if anything changed, and may throw.
      */
     using ElementAdapter<RecordAdapter, Traits>::ElementAdapter;
 
-    /** Returns the path of the current record; without key if there is none, null if the broker cannot create it. */
+    /**
+     * Returns the path of the current record. Returns a path without a key if there is no current record, and null if
+     * the broker cannot create the path.
+     */
     CMPIObjectPath* getObjectPath();
 
     /**
@@ -46,8 +49,8 @@ public:
     void modifyCMPIInstance(const CMPIInstance* referenceInstance, const char** properties);
 
     /**
-     * Removes the current record. Throws the exceptions of the element's remove(), for example if no key selected a
-     * record.
+     * Removes the current record. Throws the exceptions of the element's remove(), for example if the path has no
+     * readable key.
      */
     void deleteCMPIInstance();
 

@@ -14,8 +14,9 @@ namespace KO::LeaseWarrantyProvider {
  *
  * The class of the request's path selects the result:
  * - the association: association instances
- * - the computer system: its lease or warranty, or all of them if the path has no keys
- * - the lease or warranty: every computer of the object manager except the last, regardless of which one it belongs to
+ * - the computer system: its lease or warranty, or all leases or warranties if the path has no keys
+ * - the lease or warranty: every computer of the object manager except the last, whether or not the lease or warranty
+ *   belongs to it
  * - any other class: nothing
  *
  * Traits defines:
@@ -30,8 +31,8 @@ template <class Traits>
 class SettingAdapter {
 public:
     /**
-     * Selects the results by the path's class. Throws the exceptions of its parts, for example if there is no computer
-     * system.
+     * Selects the results by the path's class. Throws the exceptions of its members, for example if there is no
+     * computer system.
      */
     SettingAdapter(const CMPIBroker* requestBroker, const CMPIContext* requestContext, const CMPIObjectPath* path);
     ~SettingAdapter() noexcept(false);
@@ -42,7 +43,7 @@ public:
      * Returns whether to continue the iteration. The computer adapter looks one instance ahead, so an iteration over
      * computers skips the last one. An association list pairs the first computer with every lease or warranty. It then
      * pairs each further computer except the last with a "Dependent" without keys. If there is no lease or warranty, it
-     * also pairs the first computer so, unless that is the last.
+     * also pairs the first computer with such a "Dependent", unless the first computer is also the last.
      */
     operator bool();
 

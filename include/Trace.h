@@ -10,10 +10,10 @@
 #include "TraceFormat.h"
 
 /**
- * Tracing of the provider's functions. Never throws: a line that cannot be written is dropped.
+ * Tracing of the provider's functions. Tracing never throws: a line that cannot be written is dropped.
  *
  * A source file defines a TraceSource named `traceSource` with its logger and file name. A function then traces its
- * entry and its exit with its first line:
+ * entry and its exit with its first statement:
  *
  *     const Traced traced(at(traceSource), label::instanceId, instanceId);
  *
@@ -69,8 +69,8 @@ inline bool isWanted(const CallSite& site) noexcept {
 }
 
 /**
- * Writes one line to both channels. Formats it again for the second channel, since another call may overwrite the
- * buffer in between. A line that does not fit into memory is dropped.
+ * Writes one line to both channels. Formats the line again for the second channel, since another call may overwrite the
+ * buffer in between. Drops the line if formatting or writing fails.
  */
 template <class Format>
 void writeLine(const CallSite& site, Format format) noexcept {
@@ -118,8 +118,8 @@ void traceLine(const CallSite& site, MessageType type, const Parts&... parts) no
 }
 
 /**
- * Traces a function's entry when constructed and its exit when destroyed, unless an exception leaves the function. Both
- * lines have the line number of the constructor call. The parts are labels and values; the exit line contains the
+ * Traces a function's entry when constructed. Traces its exit when destroyed, unless an exception leaves the function.
+ * Both lines have the line number of the constructor call. The parts are labels and values; the exit line contains the
  * current values of variables.
  */
 template <class... Parts>
@@ -159,7 +159,7 @@ private:
 template <class... Arguments>
 Traced(const CallSite&, Arguments&&...) -> Traced<Arguments...>;
 
-/** Traces a call without entry and exit. */
+/** Traces a call with one line instead of an entry line and an exit line. */
 [[maybe_unused]] void traceMethod(const CallSite& site) noexcept {
     traceLine(site, MT_METHOD);
 }
@@ -179,7 +179,7 @@ Traced(const CallSite&, Arguments&&...) -> Traced<Arguments...>;
     writeLine(site, [&] { return trace(name, site.source->file, site.line, value); });
 }
 
-/** Logs a failure at error level and throws it. */
+/** Logs a failure at error level and throws an exception with the same text. */
 template <class Exception>
 [[noreturn]] void fail(CallSite site, const char* text) {
     site.level = Level::error;
@@ -214,7 +214,7 @@ constexpr const char* context = " _context=";
 /** Separator line before and after each request in the log. */
 constexpr const char* requestRule = "==============================================================================";
 
-/** File name and line numbers of the lines that mark a request: those of the framework's trace header. */
+/** File name and line numbers of the lines that mark a request. They are those of the framework's trace header. */
 constexpr const char* markerFile = "sdk/kolib/include/Trace.h";
 constexpr unsigned int entryRuleLine = 336;
 constexpr unsigned int entryLine = 337;
@@ -243,10 +243,10 @@ constexpr unsigned int exitRuleLine = 349;
 
 }  // namespace KO
 
-/** Logger names that the agent's log filters select by. */
+/** Names of the provider's loggers, for which the agent's configuration sets levels. */
 namespace KO::LeaseWarrantyProvider::LoggerNames {
 
-/** Logger of all translation units except the two below. */
+/** Logger of all translation units except those that use `shortened`. */
 constexpr const char* provider = "Tarvik.LeaseAndWarrantyProvider";
 
 /** Logger of OstrelAgent.cpp and AssetIDDetails.cpp. The shorter name is intentional. */

@@ -8,7 +8,7 @@
 
 /**
  * Formatting of trace lines. Each formatting function has one buffer for all its calls: a result is valid until the
- * next call of the same function. Strings are truncated at 511 characters.
+ * next call to the same function. Strings are truncated at 511 bytes.
  *
  * The functions are static, so that each translation unit has separate copies and buffers.
  */
@@ -18,15 +18,15 @@ namespace KO {
 enum MessageType : int {
     MT_ENTERING = 0,  ///< function entry
     MT_EXITING = 1,   ///< function exit
-    MT_METHOD = 2,    ///< call without entry and exit
+    MT_METHOD = 2,    ///< call, in one line instead of entry and exit
     MT_MESSAGE = 3,   ///< message, normally an error
 };
 
 constexpr std::size_t traceBufferSize = 512;
 
 /**
- * A string in a fixed buffer. Clears the buffer first and truncates the string at its end. Avoids sprintf, since
- * tracing is frequent.
+ * Writes a string to a fixed buffer. The constructor clears the buffer. A string that is too long is truncated. Avoids
+ * sprintf, since tracing is frequent.
  */
 class TraceText {
 public:
@@ -46,7 +46,7 @@ private:
         appendCharacters(shownText, std::strlen(shownText));
     }
 
-    /** Formats the number as signed, so large numbers appear as negative. */
+    /** Formats the number as signed, so numbers from 2147483648 appear as negative. */
     void appendPart(unsigned int number) {
         char digits[std::numeric_limits<int>::digits10 + 2];
         const char* digitsEnd = std::to_chars(digits, digits + sizeof digits, static_cast<int>(number)).ptr;

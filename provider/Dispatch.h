@@ -6,7 +6,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-/** A call of one of the provider's entry points: its arguments, all borrowed, and the status to return. */
+/** A call to one of the provider's entry points: its arguments, all borrowed, and the status to return. */
 struct Invocation {
     const CMPIBroker* broker;
     const CMPIContext* context;
@@ -18,7 +18,7 @@ struct Invocation {
     CMPIStatus status{CMPI_RC_OK, nullptr};
 };
 
-/** Performs an operation for a class. Calls the class's adapter or sets the status. */
+/** Performs an operation for a class: calls the class's adapter, or sets an error status. */
 using Handler = void (*)(Invocation&);
 
 /** The handlers of the operations for one class. */
@@ -34,7 +34,7 @@ struct ClassHandlers {
     Handler associatorNames;
 };
 
-/** Returns the handlers of a class id. For other classes, each handler is &Handlers::invalidClass. */
+/** Returns the handlers of a class. If the provider does not serve it, each handler is &Handlers::invalidClass. */
 const ClassHandlers& handlersOf(unsigned short classId);
 
 }  // namespace KO::LeaseWarrantyProvider

@@ -17,7 +17,7 @@
  * An entry point creates an adapter on its stack from (broker, context, object path). The adapter starts at the first
  * selected instance, if any. Broker and context are borrowed. The returned paths and instances belong to the object
  * manager, and are null if the broker cannot create them. Any operation may throw an exception derived from
- * std::exception. So may the destructor, if a change cannot be written.
+ * std::exception. The destructor may also throw one, if a change cannot be written.
  *
  * Every adapter has:
  *   operator bool()                  returns whether there is a current instance; for an association, whether to
@@ -42,7 +42,7 @@ using ObjectPathOf = decltype(std::declval<Adapter&>().getObjectPath());
 template <class Adapter>
 using InstanceOf = decltype(std::declval<Adapter&>().getCMPIInstance(std::declval<const char**>()));
 
-/** Whether a class has the operations of every adapter. */
+/** Whether a class has the operations that every adapter must have. */
 template <class Adapter>
 constexpr bool isAdapter =
     std::is_constructible_v<Adapter, const CMPIBroker*, const CMPIContext*, const CMPIObjectPath*>&&
@@ -66,8 +66,8 @@ inline void give(const CMPIResult* result, const CMPIObjectPath* path) {
 }
 
 /**
- * Iterates over the adapter of the invocation's path, returns the result of `take` for each element, and calls
- * returnDone.
+ * Iterates over the instances that the invocation's path selects, passes the result of `take` for each one to the
+ * object manager, and calls returnDone.
  */
 template <class Adapter, class Take>
 void walk(const Invocation& invocation, Take take) {
@@ -100,7 +100,7 @@ void associatorNames(Invocation& invocation) {
     walk<Adapter>(invocation, [](Adapter& adapter) { return adapter.getAssociatorNames(); });
 }
 
-/** Takes the new record's key from the path. Returns the new instance, not its path. */
+/** Creates a record with the path's key. Returns the new instance, not its path. */
 template <class Adapter>
 void create(Invocation& invocation) {
     static_assert(creates<Adapter>);

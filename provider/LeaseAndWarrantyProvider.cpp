@@ -11,7 +11,7 @@ namespace KO::LeaseWarrantyProvider {
 
 std::string loggerLeaseAndWarrantyProvider = LoggerNames::loggerName(LoggerNames::provider);
 
-/** Broker of the latest factory call. */
+/** Broker of the latest call to a factory. */
 const CMPIBroker* broker = nullptr;
 
 namespace {
@@ -48,8 +48,8 @@ unsigned short classIdOf(const CallSite& site, Class requestedClass) {
 }
 
 /**
- * Returns the namespace of a path; empty on failure. The status is that of the entry point, so that it is also returned
- * if an exception follows. ProviderUtilities::getNamespace returns no status.
+ * Returns the namespace of a path; empty on failure. Sets the status of the entry point, which is returned even if an
+ * exception follows. Does not use ProviderUtilities::getNamespace, since that returns no status.
  */
 std::string nameSpaceOf(const CMPIObjectPath* path, CMPIStatus& status) {
     if (path == nullptr) {
@@ -84,7 +84,7 @@ CMPIStatus serve(const CallSite& site, Handler ClassHandlers::*operation, Class 
     return {invocation.status.rc, nullptr};
 }
 
-/** Traces the call of an operation without a handler and returns its fixed status. */
+/** Traces the call of an operation that has no handler, and returns its fixed status. */
 CMPIStatus note(const CallSite& site, CMPIrc rc) {
     traceMethod(site);
     return {rc, nullptr};

@@ -6,8 +6,8 @@
 #include "Export.h"
 
 /**
- * The library's two factories, which the object manager looks up by name. Each stores the broker for all later requests
- * and returns the library's only interface object of its kind. They can be called repeatedly. They do not use the
+ * The library's two factories, which the object manager looks up by name. Each stores the broker for all later
+ * requests. Each always returns the same interface object, so it can be called repeatedly. The factories do not use the
  * context and do not write rc.
  */
 extern "C" {

@@ -22,14 +22,16 @@ namespace {
 constexpr const char* className = "VELKO_ComputerSystem";
 constexpr const char* keyName = "Name";
 
-/** A computer of the agent's instrumentation tree, as the class shows it. */
+/** The values of a computer node that the class returns. */
 struct Computer {
     std::string name;  ///< the key
     std::optional<std::string> vendor;
     std::optional<std::string> productName;  ///< "model - suffix"
 };
 
-/** The part of the product name before its first dash; none without product name. */
+/**
+ * The part of the product name before the first hyphen, without trailing spaces. None if there is no product name.
+ */
 std::optional<std::string> modelOf(const Computer& computer) {
     if (!computer.productName) {
         return std::nullopt;
@@ -91,7 +93,7 @@ CMPIStatus status(CMPIrc code, const char* message = nullptr) {
     return {code, message != nullptr ? cim::make<&CMPIBrokerEncFT::newString>(theBroker.load(), message) : nullptr};
 }
 
-/** The entry point of each operation that would change the computers, and of queries. */
+/** The entry point of the operations that are not supported: create, modify, delete and query. */
 template <typename... Arguments>
 CMPIStatus notSupported(Arguments...) {
     return status(CMPI_RC_ERR_NOT_SUPPORTED);
@@ -111,7 +113,9 @@ struct ResultWriter {
         return path != nullptr ? cim::tell<&CMPIResultFT::returnObjectPath>(result, path) : cannotMake();
     }
 
-    /** @param wanted names of properties in any letter case, ended by null; null for all. The key is always returned.
+    /**
+     * @param wanted null-terminated array of property names in any letter case; null for all properties. The key is
+     *               always returned.
      */
     CMPIStatus returnInstance(const Computer& computer, const char** wanted) const {
         CMPIInstance* instance = ProviderUtilities::createInstance(broker, makePath(computer));
@@ -141,7 +145,7 @@ private:
     }
 };
 
-/** Runs a handler; no exception may reach the object manager. */
+/** Runs a handler if the path has the served class. Converts exceptions, so that none reaches the object manager. */
 template <typename Handler>
 CMPIStatus guarded(const CMPIObjectPath* path, const Handler& handler) noexcept {
     try {
@@ -156,7 +160,7 @@ CMPIStatus guarded(const CMPIObjectPath* path, const Handler& handler) noexcept 
     }
 }
 
-/** Returns all computers, one by one, until one fails. */
+/** Returns all computers, one by one. Stops at the first that cannot be returned. */
 template <typename Return>
 CMPIStatus returnAll(const ResultWriter& writer, const Return& returnOne) {
     for (const Computer& computer : allComputers()) {

@@ -33,7 +33,7 @@ std::string_view reasonOf(const toml::exception& failure) {
     return message.substr(0, message.find_last_not_of(" .") + 1);
 }
 
-/** Returns the length of the string at the start of a document, with its quotation marks. */
+/** Returns the length of the string at the start of a document, including its quotation marks. */
 std::size_t stringLength(std::string_view document) {
     const char quote = document.front();
     const std::string_view longDelimiter = quote == '"' ? R"(""")" : "'''";
@@ -46,7 +46,7 @@ std::size_t stringLength(std::string_view document) {
     }
     length += delimiter.size();
     for (int more = 0; isMultiLine && more < 2 && length < document.size() && document[length] == quote; ++more) {
-        ++length;  // quotation marks at the end of the value itself
+        ++length;  // quotation marks that belong to the value
     }
     return std::min(length, document.size());
 }
@@ -72,7 +72,7 @@ bool isOneOf(char byte, std::string_view bytes) {
 
 std::optional<std::size_t> lineNestedTooDeep(std::string_view document) {
     int brackets = 0;
-    int dots = 0;  // of one key
+    int dots = 0;  // in the current key
     std::size_t line = 1;
     while (!document.empty()) {
         const char first = document.front();

@@ -21,17 +21,17 @@ public:
 
     /**
      * Reads the configuration file of this process: the one that OSTREL_CONFIG names, else /etc/ostrel/agent.toml. A
-     * process that runs with another user's privileges ignores the variable.
+     * process that has more privileges than its caller ignores the variable.
      */
     static Document readDefault();
 
-    /** Parses a document; problems contain the name. */
+    /** Parses a document. Its problem starts with the name. */
     static Document parse(std::string_view text, const std::string& name);
 
     /** One sentence on why the file could not be used; empty if it was used. */
     const std::string& problem() const { return whatIsWrong; }
 
-    /** Returns a reader of the document. It must not outlive the document or the problems. */
+    /** Returns a reader of the document. The reader must not outlive the document or the problems. */
     TableReader root(Problems& problems) const { return TableReader(table.get(), "", problems); }
 
 private:
@@ -43,8 +43,8 @@ private:
 constexpr int deepestNesting = 16;
 
 /**
- * Returns the first line of a TOML document in which brackets or the parts of a key are nested deeper. The TOML
- * parser recurses for each level and would overflow the stack.
+ * Returns the number of the first line of a TOML document at which more than 16 brackets are nested or a key has more
+ * than 16 dots; none if there is no such line. The TOML parser recurses for each level and could overflow the stack.
  */
 std::optional<std::size_t> lineNestedTooDeep(std::string_view document);
 

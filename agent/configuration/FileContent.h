@@ -8,7 +8,7 @@
 
 namespace Agent {
 
-/** An open file descriptor, closed when its owner is destroyed. */
+/** Owns a file descriptor and closes it when destroyed. */
 class FileDescriptor {
 public:
     FileDescriptor() = default;
@@ -31,12 +31,12 @@ private:
     int descriptor = -1;
 };
 
-/** The content of a file, or the error of reading it. */
+/** The content of a file, or the error if it could not be read. */
 struct FileContent {
     std::string text;
     int error = 0;  ///< errno value; 0 on success
 
-    /** Whether the file does not exist, as opposed to one that cannot be read. */
+    /** Whether the error is that the file does not exist. */
     bool absent() const { return error == ENOENT || error == ENOTDIR; }
 };
 
@@ -47,7 +47,7 @@ struct FileContent {
 FileContent readFile(const std::string& path);
 
 /**
- * Appends the rest of an open file to a string, within the same limit.
+ * Appends the rest of an open file to a string. Fails if the string would exceed 16 MiB.
  * @return errno value; 0 on success
  */
 int readRest(int file, std::string& text);

@@ -8,7 +8,7 @@
 #include <utility>
 #include <vector>
 
-// Declared here so that only the files that parse or read values include the library.
+// Forward declarations, so that only the source files that parse or read values include the TOML library.
 namespace toml {
 struct discard_comments;
 template <typename Comments, template <typename...> class Table, template <typename...> class Array>
@@ -17,7 +17,7 @@ class basic_value;
 
 namespace Agent {
 
-/** A value of the configuration file; its tables are sorted by key. */
+/** A value of the configuration file. Tables are sorted by key. */
 using TomlValue = toml::basic_value<toml::discard_comments, std::map, std::vector>;
 using TomlTable = std::map<std::string, TomlValue>;
 
@@ -25,14 +25,15 @@ using TomlTable = std::map<std::string, TomlValue>;
 using Problems = std::vector<std::string>;
 
 /**
- * Reads the keys of one table of the configuration and records its problems: values of the wrong kind and, at the end,
- * unknown keys. For a value that is absent or wrong the functions return no value, and the caller uses its default.
+ * Reads the keys of one table of the configuration. Records a problem for each invalid value and, in
+ * rejectUnknownKeys(), for each unknown key. If a value is absent or invalid, the functions return no value, and the
+ * caller uses its default.
  */
 class TableReader {
 public:
     /**
-     * @param table    the table; null for an empty one
-     * @param name     the table's name in problems, such as "log"; empty for the document
+     * @param table    the table; null for an empty table
+     * @param name     the table's name in problems, such as "log"; empty for the root table
      * @param problems receives the problems
      */
     TableReader(const TomlTable* table, std::string name, Problems& problems);
@@ -47,13 +48,13 @@ public:
     /** The strings of an array. */
     std::optional<std::vector<std::string>> strings(std::string_view key);
 
-    /** The table under a key; an empty one if there is none. */
+    /** The table under a key; an empty table if there is none. */
     TableReader table(std::string_view key);
 
     /** The tables of the array of tables under a key, in order. */
     std::vector<TableReader> tables(std::string_view key);
 
-    /** All keys with string values, in the order of the keys; records a problem for each other value. */
+    /** All string values with their keys, sorted by key. Records a problem for each value of another type. */
     std::vector<std::pair<std::string, std::string>> allStrings();
 
     /** Returns whether the table has the key, with a value of any kind, and marks the key as known. */
@@ -62,14 +63,14 @@ public:
     /** Records a problem with the value of a key. */
     void reject(std::string_view key, const std::string& why);
 
-    /** Records a problem for each key that no other function has been called for. */
+    /** Records a problem for each key of the table that is not marked as known. */
     void rejectUnknownKeys();
 
 private:
-    /** Returns the value of a key, null if there is none, and marks the key as known. */
+    /** Marks a key as known and returns its value; null if there is none. */
     const TomlValue* find(std::string_view key);
 
-    /** Also returns null for a value that is not valid, and records a problem with the requirement. */
+    /** Like find(key), except that an invalid value yields null and a problem that states the requirement. */
     template <class IsValid>
     const TomlValue* find(std::string_view key, IsValid isValid, const std::string& requirement);
     std::string nameOf(std::string_view key) const;

@@ -10,7 +10,7 @@ namespace {
 
 constexpr std::int64_t largestNumber = 0xFFFF;
 
-/** A number derived from the machine id that does not reveal the machine id. */
+/** A number that is derived from the machine id but does not reveal it; "unknown" if it cannot be derived. */
 std::string defaultIdentifyingNumber() {
     sd_id128_t agent{};
     sd_id128_t number{};
@@ -50,7 +50,7 @@ void readProduct(Agent::TableReader table, AgentSettings& settings) {
     product.buildNumber = table.nonEmptyString("build_number").value_or("1");
     if (std::optional<std::string> number = table.nonEmptyString("identifying_number")) {
         product.identifyingNumber = std::move(*number);
-    } else {  // reads a file
+    } else {  // derived only if needed, since this reads a file
         product.identifyingNumber = defaultIdentifyingNumber();
     }
     product.vendor = table.nonEmptyString("vendor").value_or("VEL");

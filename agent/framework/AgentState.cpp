@@ -35,8 +35,8 @@ std::shared_ptr<const AgentState> readAgentState() {
     return agent;
 }
 
-// Threads may call agentState() while static objects are destroyed at exit. They use only the mutex and the pointer
-// then, which need no destruction.
+// Threads may call agentState() while static objects are destroyed at exit. The mutex and the pointer remain valid,
+// since they need no destruction.
 std::mutex agentMutex;
 std::shared_ptr<const AgentState>* agent = nullptr;
 
@@ -68,7 +68,7 @@ bool Settings::getFlag(const std::string& name, bool otherwise) {
     return found == state->settings.flags.end() ? otherwise : found->second;
 }
 
-// The strings outlive the calls: the state is destroyed when the library is unloaded.
+// The strings remain valid after the calls, since the state exists until the library is unloaded.
 const char* PlatformUtilities::getKelsaDirectory() {
     return agentState()->settings.installDirectory.c_str();
 }

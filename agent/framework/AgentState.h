@@ -30,7 +30,7 @@ struct AgentSettings {
     std::map<std::string, bool> flags;  ///< the configured flags, by table and key: "gate.refuse_lossy_values"
 };
 
-/** Reads the settings; absent and wrong values have their defaults. */
+/** Reads the settings. A setting whose value is absent or invalid has its default. */
 AgentSettings readAgentSettings(const Agent::Document& document, Agent::Problems& problems);
 
 /** The agent's configuration, and the nodes of the managed system. */
@@ -45,7 +45,7 @@ struct AgentState {
  */
 std::shared_ptr<const AgentState> agentState();
 
-/** Drops the state, so that the next call of agentState() reads it again. For tests with several configurations. */
+/** Drops the state, so that the next call to agentState() reads it again. For tests with several configurations. */
 void forgetAgentState();
 
 }  // namespace KO

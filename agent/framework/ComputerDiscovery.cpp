@@ -13,7 +13,7 @@ namespace KO {
 
 namespace {
 
-/** Placeholders of firmware for missing values, compared without letter case. */
+/** Placeholders that firmware contains for missing values. Letter case is ignored. */
 constexpr const char* placeholders[] = {
     "",
     "default string",
@@ -34,7 +34,7 @@ constexpr const char* placeholders[] = {
     "unknown",
 };
 
-/** SMBIOS names of chassis types, starting with 1; empty for types without meaning. */
+/** SMBIOS names of chassis types, starting with type 1; empty for types that do not describe the chassis. */
 constexpr const char* chassisWords[] = {
     "",  // Other
     "",  // Unknown
@@ -80,7 +80,8 @@ bool isPlaceholder(const std::string& text) {
 }
 
 /**
- * Replaces runs of blanks, control characters and bytes that are not UTF-8 by one blank, and removes them at the ends.
+ * Replaces each run of blanks, control characters and bytes that are not UTF-8 by one blank. Removes such runs at both
+ * ends.
  */
 std::string tidy(std::string_view text) {
     std::string tidied;
@@ -100,13 +101,13 @@ std::string tidy(std::string_view text) {
     return tidied;
 }
 
-/** Returns the printable string; empty if it is a placeholder. */
+/** Returns the result of tidy(); empty if it is a placeholder. */
 std::string meaningful(std::string_view text) {
     std::string tidied = tidy(text);
     return isPlaceholder(tidied) ? std::string() : tidied;
 }
 
-/** Returns the value of a DMI file; empty if the file is absent, unreadable or a placeholder. */
+/** Returns the value of a DMI file; empty if the file is absent or unreadable or contains a placeholder. */
 std::string readDmi(const std::string& path, Agent::Problems& problems) {
     const Agent::FileContent file = Agent::readFile(path);
     if (file.error != 0 && !file.absent()) {
@@ -130,7 +131,7 @@ std::string chassisWord(const std::string& text) {
     return chassisWords[type - 1];
 }
 
-/** Returns "model - suffix". Callers cut the name at its first dash, so the model must not contain one. */
+/** Returns "model - suffix". Readers take the model from before the first hyphen, so it must not contain one. */
 std::string productName(std::string model, const std::string& chassis) {
     std::replace(model.begin(), model.end(), '-', ' ');
     return orElse(meaningful(model), "Computer") + " - " + orElse(chassisWord(chassis), "Computer");

@@ -12,7 +12,7 @@ namespace {
 
 constexpr unsigned int localTime = 3;
 
-/** Returns the offset of local time from UTC in minutes at a moment. */
+/** Returns the offset of local time from UTC at a moment, in minutes. */
 int localOffset(std::time_t moment) {
     std::tm fields{};
     return ::localtime_r(&moment, &fields) != nullptr ? static_cast<int>(fields.tm_gmtoff / 60) : 0;
@@ -20,7 +20,7 @@ int localOffset(std::time_t moment) {
 
 }  // namespace
 
-/** Stores the date as its CIM datetime string, to keep all digits of the client; empty for no date. */
+/** Stores the date as its CIM datetime string, to keep all digits that a client sent; empty for an unset date. */
 struct DateTime::Implementation {
     std::string text;
 };

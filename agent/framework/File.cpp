@@ -36,13 +36,13 @@ int checkRegular(int file) {
     throwFileError("Cannot write ", path, errno);
 }
 
-/** Returns a distinct name in the file's directory, so that a file that a crash leaves can be recognized. */
+/** Returns a name template in the target's directory. The name identifies files that remain after a crash. */
 std::string temporaryNameFor(const std::string& target) {
     const std::size_t name = target.rfind('/') + 1;
     return target.substr(0, name) + "." + target.substr(name) + ".new-XXXXXX";
 }
 
-/** A new file in the directory of the file to replace; removed unless it has replaced that file. */
+/** A temporary file in the directory of the file to replace. The destructor removes it unless it was renamed. */
 class TemporaryFile {
 public:
     explicit TemporaryFile(const std::string& target)
@@ -114,7 +114,8 @@ private:
 };
 
 /**
- * Returns the file that a path resolves to; the path itself if there is none. Fails for a link that cannot be resolved.
+ * Follows symbolic links. Returns the path itself if no file exists there. Fails if the path cannot be resolved for
+ * another reason, such as a loop of links.
  */
 std::string followLinks(const std::string& path) {
     std::error_code error;
@@ -125,7 +126,7 @@ std::string followLinks(const std::string& path) {
     return error ? path : target.string();
 }
 
-/** Forces the renaming to the disk. Ignores failures, because the file has been replaced. */
+/** Forces the renaming to the disk. Ignores failures, because the file is already replaced. */
 void syncDirectoryOf(const std::string& path) {
     const std::string directory = path.find('/') == std::string::npos ? "." : path.substr(0, path.rfind('/') + 1);
     const Agent::FileDescriptor file(::open(directory.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));

@@ -30,7 +30,7 @@ timespec afterMilliseconds(unsigned long milliseconds) {
 
 }  // namespace
 
-/** Reports errors: a second lock by the same thread fails instead of deadlocking. */
+/** An error-checking mutex: a second lock by the same thread fails instead of deadlocking. */
 struct Mutex::Implementation {
     pthread_mutex_t mutex{};
 
@@ -46,7 +46,7 @@ struct Mutex::Implementation {
     Implementation& operator=(const Implementation&) = delete;
 };
 
-// Mutexes are static objects. If out of memory, lock() fails instead of the loading of the library.
+// Mutexes are static objects. When out of memory, a library with a mutex can still be loaded, but lock() fails.
 Mutex::Mutex() : implementation(new (std::nothrow) Implementation) {}
 Mutex::~Mutex() = default;
 

@@ -31,7 +31,8 @@ private:
 std::string hostName();
 
 /**
- * The nodes of this computer: the system, and below it the computer, both with its name, vendor and product name.
+ * Returns the nodes of this computer: the system, and the computer below it. Both nodes have the computer's name,
+ * vendor and product name.
  * @param dmiRoot directory of the kernel's DMI files, ending with a separator
  * @param name    the computer's name
  * @param problems receives a sentence for each existing file that cannot be read
@@ -39,12 +40,12 @@ std::string hostName();
 NodeTree discoverComputer(const std::string& dmiRoot, const std::string& name, Agent::Problems& problems);
 
 /**
- * Encodes a node path: every byte except letters, digits and . / : - becomes %NN, with the byte in upper-case
- * hexadecimal digits.
+ * Encodes a node path: every byte except ASCII letters, digits and . / : - becomes %NN, the byte's value in two
+ * upper-case hexadecimal digits.
  */
 std::string pathToText(const std::string& path);
 
-/** Decodes a path. Returns strings that are not the encoding of any path unchanged. */
+/** Decodes a path. If the string is not the encoding of a path, returns it unchanged. */
 std::string textToPath(const std::string& text);
 
 }  // namespace KO

@@ -8,8 +8,8 @@ namespace {
 
 constexpr std::string_view hexDigits = "0123456789ABCDEF";
 constexpr std::string_view blanks = " \t\r";
-constexpr std::string_view namedBytes = "\\\n\r";  // with an escape of one letter
-constexpr std::string_view namesOfBytes = "\\nr";  // in the same order
+constexpr std::string_view namedBytes = "\\\n\r";  // with an escape of two characters
+constexpr std::string_view namesOfBytes = "\\nr";  // the second character of each escape
 
 std::string_view trim(std::string_view text) {
     const std::size_t first = text.find_first_not_of(blanks);
@@ -49,7 +49,7 @@ std::string escape(const std::string& plain, std::string_view alsoEscaped) {
     return text;
 }
 
-/** Decodes the escape at the head of a string. @return its length; 0 if there is none */
+/** Decodes the escape at the start of a string. @return its length; 0 if there is none */
 std::size_t decodeEscape(std::string_view text, char& byte) {
     if (text.size() < 2 || text[0] != '\\') {
         return 0;

@@ -30,7 +30,7 @@ constexpr ClassEntry classIds[] = {
     {"VELKO_AssetIDDetails", ClassId::assetIDDetails},
 };
 
-/** Returns a value of type CMPI_chars, which is the pointer to the characters itself. */
+/** Returns a value of type CMPI_chars. CMPI passes such a value as the pointer to the characters. */
 const CMPIValue* asValue(const char* characters) {
     return reinterpret_cast<const CMPIValue*>(characters);
 }
@@ -52,7 +52,7 @@ Read getPropertyData(const CMPIInstance* instance, const char* name) {
     return name != nullptr ? cim::ask<&CMPIInstanceFT::getProperty>(instance, name) : Read{};
 }
 
-/** @param value null sets the property to null */
+/** @param value the value; null sets the property to null */
 void setPropertyValue(CMPIInstance* instance, const char* name, const CMPIValue* value, CMPIType type) {
     if (name != nullptr) {
         cim::tell<&CMPIInstanceFT::setProperty>(instance, name, value, type);
@@ -71,7 +71,7 @@ bool isPresent(const Read& read, CMPIType type) {
 }
 
 /** @name Values read from a broker
- * None when the reading failed, the value is null, or it is of another type.
+ * None if reading failed, or if the value is null or has another type.
  */
 ///@{
 std::optional<std::string> stringOf(const Read& read) {
@@ -101,7 +101,7 @@ std::optional<std::string> keyOf(const Read& read) {
     return isKeyType ? cim::charactersOf(read.value) : std::nullopt;
 }
 
-/** A reference; null for none. It belongs to the broker. */
+/** A reference, owned by the broker; null if there is none. */
 CMPIObjectPath* referenceOf(const Read& read) {
     return isPresent(read, CMPI_ref) ? read.value.value.ref : nullptr;
 }

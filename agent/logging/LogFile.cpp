@@ -34,10 +34,10 @@ public:
     }
 
 private:
-    /** Opens the file. Does not wait for the reader of a pipe, follows no link, and creates no directory. */
+    /** Opens the file. Does not wait for the reader of a pipe, refuses a symbolic link, and creates no directory. */
     void open() {
         constexpr int flags = O_WRONLY | O_APPEND | O_CREAT | O_NOFOLLOW | O_CLOEXEC | O_NONBLOCK | O_NOCTTY;
-        constexpr mode_t modeOfNewFiles = 0640;  // records contain values of clients
+        constexpr mode_t modeOfNewFiles = 0640;  // records contain values that clients sent
         file = Agent::FileDescriptor(::open(path.c_str(), flags, modeOfNewFiles));
         struct stat status {};
         if (file.get() < 0 || ::fstat(file.get(), &status) != 0) {
@@ -61,7 +61,7 @@ private:
         }
     }
 
-    /** A full file that cannot be renamed is emptied: the log must not fill the disk. */
+    /** Renames the files and opens a new one. Empties a full file that it cannot rename, to limit the disk usage. */
     void rotate() {
         for (std::size_t number = rotationCount; number > 0; --number) {
             const bool isRenamed = std::rename(nameOf(number - 1).c_str(), nameOf(number).c_str()) == 0;
@@ -72,7 +72,7 @@ private:
         open();
     }
 
-    /** Returns the name of a rotated file, with its number before the extension; 0 is the log file itself. */
+    /** Returns the name of a rotated file, which has its number before the extension. 0 is the log file itself. */
     std::string nameOf(std::size_t number) const {
         if (number == 0) {
             return path;

@@ -22,14 +22,14 @@ struct ChannelLevels {
 
 /**
  * The levels of the loggers. Reading them allocates nothing, takes no lock and works until the library is unloaded,
- * also after static objects are destroyed: hence the fixed sizes.
+ * even after static objects are destroyed. For this reason, the sizes are fixed.
  */
 class Levels {
 public:
     static constexpr std::size_t mostLoggers = 64;
     static constexpr std::size_t longestName = 127;
 
-    /** Sets the levels of all other loggers. */
+    /** Sets the levels of all loggers for which set() is not called. */
     void setDefault(ChannelLevels levels) { fallback = levels; }
 
     /** Sets one logger's levels. @return false if there is no room or the name is too long */
@@ -41,7 +41,7 @@ public:
     /** The highest level that any channel of any logger writes. */
     int highest() const;
 
-    /** Whether to write a record of that level. */
+    /** Whether a channel writes a logger's record of a level. */
     bool admit(Channel channel, std::string_view logger, int level) const { return level <= of(logger).of(channel); }
 
 private:
@@ -67,7 +67,7 @@ struct LogSettings {
     Levels levels;
 };
 
-/** Reads the [log] table; absent and wrong values have their defaults. */
+/** Reads the [log] table. A setting whose value is absent or invalid has its default. */
 LogSettings readLogSettings(const Agent::Document& document, Agent::Problems& problems);
 
 }  // namespace RZLog

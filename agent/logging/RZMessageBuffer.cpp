@@ -28,8 +28,8 @@ protected:
 };
 
 /**
- * Implementations that no buffer uses. Has no lock, and no thread-local data, whose destructors would keep the library
- * from being unloaded.
+ * Unused elements for later use. Uses atomic pointers instead of a lock. Does not use thread-local data, since their
+ * destructors would keep the library from being unloaded.
  */
 template <typename Element, std::size_t Size>
 class Pool {
@@ -40,7 +40,7 @@ public:
         }
     }
 
-    /** @return null when the pool is empty */
+    /** Removes an element. @return null if the pool is empty */
     std::unique_ptr<Element> take() {
         for (std::atomic<Element*>& place : places) {
             if (place.load(std::memory_order_relaxed) != nullptr) {
@@ -52,7 +52,7 @@ public:
         return nullptr;
     }
 
-    /** Stores an element if there is room. */
+    /** Stores an element, or destroys it if there is no room. */
     void give(std::unique_ptr<Element> element) {
         for (std::atomic<Element*>& place : places) {
             Element* none = nullptr;

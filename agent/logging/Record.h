@@ -6,7 +6,7 @@
 
 namespace RZLog {
 
-/** The logger of the agent's libraries. */
+/** The name of the logger of the agent's libraries. */
 constexpr const char* ownLogger = "Ostrel.Agent";
 
 /** The level of errors. */
@@ -29,7 +29,7 @@ struct Record {
 /** The record's line in a log file, without line end: eight fields, separated by tabs. */
 std::string fileLine(const Record& record, std::chrono::system_clock::time_point time);
 
-/** The record's line in a system log, which adds the time itself. */
+/** The record's line for a system log, without the time, which the log adds. */
 std::string systemLogLine(const Record& record);
 
 /**

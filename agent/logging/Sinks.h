@@ -15,24 +15,24 @@ public:
     Sink& operator=(const Sink&) = delete;
     virtual ~Sink() = default;
 
-    /** Writes one record. A later crash of the process does not lose it. @throws std::exception on failure */
+    /** Writes one record. The record survives a later crash of the process. @throws std::exception on failure */
     virtual void write(const Record& record) = 0;
 };
 
 /**
  * Opens the sink that appends each record as one line to the log file of the settings. When a record would make the
- * file larger than the rotation size, the file is renamed and a new one is begun.
+ * file larger than the rotation size, the file is renamed and a new file is created.
  * @throws std::system_error if the file cannot be opened or is not a regular file
  */
 std::unique_ptr<Sink> openLogFile(const LogSettings& settings);
 
 /**
- * The sinks of the system log and of systemd's journal. Each sends one datagram per record to the service's socket.
- * They do not use syslog(3) or sd_journal_send(3), which block while the service does not read. A record that the
- * service does not receive at once is dropped. Dropped records are counted, and the count is reported before the next
- * record that is sent. Longer records are truncated to longestText.
+ * Opens the sink of the system log, or of systemd's journal. The sink sends one datagram per record to the service's
+ * socket. It does not use syslog(3) or sd_journal_send(3), which block while the service does not read. If a datagram
+ * cannot be sent at once, the record is dropped. Dropped records are counted, and the count is reported before the next
+ * record that is sent. A record longer than longestText is truncated.
  *
- * @param settings   the levels, which decide whether the library's own logger reports dropped records
+ * @param settings   the levels; whether dropped records are reported depends on those of the library's own logger
  * @param socketPath the service's socket, looked up for each record
  * @throws std::system_error if no socket can be created
  */
@@ -42,7 +42,7 @@ std::unique_ptr<Sink> openJournal(const LogSettings& settings,
                                   const std::string& socketPath = "/run/systemd/journal/socket");
 ///@}
 
-/** Maximum number of bytes of a record that fit into a datagram on every system. */
+/** Maximum number of bytes of a record's line. A datagram of this size can be sent on every system. */
 constexpr std::size_t longestText = 100000;
 
 }  // namespace RZLog

@@ -15,7 +15,7 @@ namespace RZLog {
 
 namespace {
 
-/** A socket that sends datagrams to a path and never waits. */
+/** A socket that sends datagrams to a path without waiting. */
 class DatagramSocket {
 public:
     explicit DatagramSocket(const std::string& path)
@@ -27,7 +27,7 @@ public:
         path.copy(address.sun_path, sizeof address.sun_path - 1);
     }
 
-    /** Not connected, so that a restarted service receives the datagram. @return whether it was sent */
+    /** Sends without a connection, so that the service can be restarted. @return whether the datagram was sent */
     bool send(const std::string& content) const {
         return ::sendto(descriptor.get(), content.data(), content.size(), MSG_NOSIGNAL | MSG_DONTWAIT,
                         reinterpret_cast<const sockaddr*>(&address), sizeof address) >= 0;
@@ -49,7 +49,7 @@ std::string cut(std::string text) {
     return text;
 }
 
-/** Formats a line as message to the service, with priority LOG_ERR or LOG_DEBUG. */
+/** Formats a line as a message to the service, with priority LOG_ERR or LOG_DEBUG. */
 using Form = std::string (*)(int priority, const std::string& line);
 
 class DatagramSink : public Sink {
@@ -68,7 +68,7 @@ private:
         return service.send(form(record.level <= errorLevel ? LOG_ERR : LOG_DEBUG, cut(systemLogLine(record))));
     }
 
-    /** @return whether nothing is left to report */
+    /** Reports the number of dropped records. @return whether nothing is left to report */
     bool reportDropped() {
         if (dropped == 0) {
             return true;
@@ -87,7 +87,7 @@ private:
     unsigned long dropped = 0;
 };
 
-/** The format of syslog(3) in a process that has not called openlog(3). */
+/** The format of syslog(3), with facility LOG_DAEMON and the program's name. */
 std::string systemLogMessage(int priority, const std::string& line) {
     const std::time_t now = std::time(nullptr);
     std::tm fields{};
@@ -100,7 +100,7 @@ std::string systemLogMessage(int priority, const std::string& line) {
     return "<" + std::to_string(LOG_DAEMON | priority) + ">" + time + " " + program_invocation_short_name + ": " + line;
 }
 
-/** The journal's native protocol; a line contains no line end. */
+/** The format of the journal's native protocol. The line contains no line feed, since line feeds are escaped. */
 std::string journalMessage(int priority, const std::string& line) {
     return "MESSAGE=" + line + "\nPRIORITY=" + std::to_string(priority) + "\nSYSLOG_IDENTIFIER=ostrel-agent\n";
 }

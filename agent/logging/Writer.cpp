@@ -10,7 +10,7 @@
 #include "RZLog/RZLogger.h"
 #include "logging/Sinks.h"
 
-// The functions of RZLogger: writes records to the destination of the configuration.
+// The functions of RZLogger. They write records to the configured destination.
 
 namespace RZLog {
 
@@ -28,7 +28,7 @@ struct Output {
     std::chrono::steady_clock::time_point nextOpening = std::chrono::steady_clock::time_point::min();
 };
 
-// A thread may log while static objects are destroyed at exit. It uses only the mutex and the pointer then, which need
+// Threads may log while static objects are destroyed at exit. The mutex and the pointer remain valid, since they need
 // no destruction.
 std::mutex outputMutex;
 Output* output = nullptr;
@@ -41,7 +41,7 @@ struct OutputOwner {
     }
 } outputOwner;
 
-/** Opens the destination of the settings. @return null if there is none  @throws std::exception on failure */
+/** Opens the configured destination. @return null if there is none  @throws std::exception on failure */
 std::unique_ptr<Sink> openSink(const LogSettings& settings) {
     switch (settings.destination) {
         case LogSettings::Destination::file:
@@ -76,8 +76,8 @@ void writeUnlessFailing(const Record& record) noexcept {
 }
 
 /**
- * Writes a record to the configured destination. If that fails, drops the record and reopens the destination some
- * seconds later. Drops records after the library's static objects are destroyed.
+ * Writes a record to the configured destination. If that fails, drops the record and closes the destination. Reopens
+ * the destination at most every 10 seconds. Drops records after the library's static objects are destroyed.
  */
 void write(const Record& record) noexcept {
     const std::lock_guard<std::mutex> lock(outputMutex);
@@ -96,7 +96,7 @@ void reportProblems(const Agent::Problems& problems, const Levels& levels) {
     }
 }
 
-/** Admits nothing, so that callers do not format records that are not written. */
+/** Levels that admit no record, so that callers do not format records that are not written. */
 Levels silence() {
     constexpr int lowest = std::numeric_limits<int>::min();
     Levels levels;
@@ -124,8 +124,8 @@ Levels configure() {
 }
 
 /**
- * The highest levels that the channels write for a logger. The first call in the process reads the configuration. If it
- * has no destination, nothing is written.
+ * The highest levels that the channels write for a logger. The first call in the process reads the configuration. If
+ * the configuration has no destination, the levels admit no record.
  */
 const ChannelLevels& levelsOf(std::string_view logger) {
     static_assert(std::is_trivially_destructible_v<Levels>, "levels are read while static objects are destroyed");
@@ -138,8 +138,8 @@ std::string_view orEmpty(const char* text) {
 }
 
 /**
- * Keeps errno for the caller, and disables the cancellation of the thread while a record is written: cancellation
- * unwinds the stack with an exception, which no catch may swallow.
+ * Restores errno for the caller, and disables the cancellation of the thread while a record is written. Cancellation
+ * unwinds the stack with an exception that `catch (...)` must not swallow.
  */
 class PreserveErrno {
 public:
@@ -170,8 +170,8 @@ void writeIfAdmitted(const Record& record) noexcept {
 }
 
 /**
- * Whether a channel admits records of this level; true if that cannot be determined. Not inline: most calls of
- * admits() return before they need it.
+ * Whether either channel admits records of this level; true if that cannot be determined. Not inlined, since most calls
+ * to admits() return without calling this function.
  */
 [[gnu::noinline]] bool mayAdmit(const std::string& logger, int level) noexcept {
     const PreserveErrno preserveErrno;
@@ -195,7 +195,7 @@ void RZLogger::traceLevelMessage(const char* function, const char* file, int lin
 }
 
 bool RZLogger::admits(const std::string& logger, int level) noexcept {
-    // Most records end at the first comparison.
+    // For most records, the first comparison is false.
     return level <= highestLevel.load(std::memory_order_relaxed) && mayAdmit(logger, level);
 }
 

@@ -1,1 +1,1 @@
-"""Shared by the fleet tools: reading the data of a machine, dates and terms, writing of files."""
+"""Modules that the fleet tools share. They read the data of machines, calculate dates and write files."""

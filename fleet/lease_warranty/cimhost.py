@@ -1,4 +1,4 @@
-"""Runs cimhost. It serves the classes with the provider that is registered: the gate, or the provider without it."""
+"""Runs cimhost, which calls the registered library: the gate, or the provider without the gate."""
 
 import json
 import subprocess
@@ -7,7 +7,7 @@ TIME_LIMIT = 60  # seconds for one request
 
 
 class Unreadable(Exception):
-    """The data cannot be read, or are not consistent; the message says why and what to do."""
+    """The data cannot be read or are inconsistent. The message gives the reason and, if known, what to do."""
 
 
 class Refused(Exception):
@@ -15,7 +15,7 @@ class Refused(Exception):
 
 
 def run(*arguments):
-    """Standard output, exit status and error message of a request."""
+    """Runs a request. Returns its standard output, exit status and error message."""
     try:
         ended = subprocess.run(["cimhost", *arguments], stdin=subprocess.DEVNULL, stdout=subprocess.PIPE,
                                stderr=subprocess.PIPE, timeout=TIME_LIMIT, check=False)
@@ -27,7 +27,7 @@ def run(*arguments):
 
 
 def query(*arguments):
-    """The parsed response to a request that reads."""
+    """Sends a request that reads data, and returns the parsed response."""
     output, status, message = run("--format", "json", *arguments)
     if status != 0:
         raise Unreadable(message or f"cimhost ended with status {status}.")

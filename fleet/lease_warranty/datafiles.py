@@ -1,5 +1,5 @@
-"""Checks that the provider could read its data files. It reports an unreadable file as one without records, and a
-damaged file as one with other records; so the files are compared with its answer."""
+"""Checks that the provider could read its data files. For an unreadable file, the provider returns no records; for a
+damaged file, it can return wrong records. The check therefore compares the files with the returned records."""
 
 import os
 import pathlib
@@ -35,7 +35,7 @@ def data_directory():
 
 
 def contents(directory):
-    """The content of each data file; None for one that does not exist."""
+    """The content of each data file; None for a file that does not exist."""
     if not directory.is_dir():
         raise Unreadable(f"The data directory {directory} does not exist.")
     found = {}
@@ -51,7 +51,8 @@ def contents(directory):
 
 
 def check_records(kind, path, content, identifiers):
-    """Compares a record file with the records that were returned."""
+    """Checks that a record file has the records that the provider returned.
+    @throws Unreadable"""
     words = (content or b"").split() or [b"0"]
     try:
         count = int(words[0])
@@ -67,5 +68,6 @@ def check_records(kind, path, content, identifiers):
 
 
 def comparable(identifier):
-    """The identifier without replacement characters, and with a blank for each underscore, as the provider reads it."""
+    """The identifier without replacement characters, and with each underscore replaced by a blank, as the provider
+    does."""
     return identifier.replace("\ufffd", "").replace("_", " ")

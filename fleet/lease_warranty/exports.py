@@ -1,4 +1,4 @@
-"""Reads the data of many machines: exports, Ansible's facts cache, and the trees of its module setup."""
+"""Reads the data of many machines from exports, Ansible's facts cache, and output of "ansible -m setup --tree"."""
 
 import collections
 import json
@@ -7,14 +7,14 @@ from . import machine
 from .cimhost import Unreadable
 from .kinds import KINDS
 
-# data: as read_machine() returns it, or None; reason: why there is none
+# data: the result of read_machine(), or None; reason: why the data are missing
 Machine = collections.namedtuple("Machine", "name data reason")
 NO_FACT = "The facts have no lease_warranty. Is the package lease-warranty-facts installed?"
 
 
 def checked(data):
-    """The data of a machine.
-    @throws ValueError if they have another form"""
+    """Returns the data of a machine unchanged.
+    @throws ValueError if the data do not have the form of an export"""
     if not isinstance(data, dict) or data.get("format") != machine.FORMAT:
         raise ValueError(f"not an export in format {machine.FORMAT}")
     for name in ("asset", "agent"):
@@ -51,7 +51,7 @@ def read_file(path):
 
 
 def files_of(source):
-    """A file, or the files of a directory that are not hidden."""
+    """Returns the source itself if it is a file, or the files in it, except hidden ones, if it is a directory."""
     try:
         return sorted(each for each in source.iterdir() if not each.name.startswith(".")) if source.is_dir() else [source]
     except OSError as error:
@@ -59,10 +59,10 @@ def files_of(source):
 
 
 def read_machines(sources, expected=(), skip_unreadable=False):
-    """The machines by name.
+    """Returns the machines by name.
 
     @param expected         names of machines that should have data
-    @param skip_unreadable  report a file that cannot be read as a machine without data"""
+    @param skip_unreadable  return a machine without data for an unreadable file, instead of failing"""
     found = {}
     for path in (path for source in sources for path in files_of(source)):
         try:

@@ -1,8 +1,8 @@
-"""Leases and warranties: the properties with their party, start and term, and the layout of their data files."""
+"""Leases and warranties: the names of the properties with party, start and term, and the layout of the data files."""
 
 import collections
 
-# name: of one record; fields: words of a record in the data file
+# name: singular of the kind; fields: number of words per record in the data file
 Kind = collections.namedtuple("Kind", "name class_name file fields party start term")
 
 KINDS = {

@@ -8,13 +8,14 @@ from .cimhost import Unreadable, query
 from .kinds import KINDS
 
 FORMAT = 1
-ATTEMPTS = 3  # while other processes change the data files
-# Values that never differ, and a clock.
+ATTEMPTS = 3  # to read the data files while no other process changes them
+# Properties that are constant or repeat another property, and the current time.
 OMITTED = {"Caption", "Description", "ElementName", "AssetIDStringArea", "LocalDateTime"}
 
 
 def value_of(name, described, place):
-    """Returns a value for the JSON document: datetimes in ISO 8601 form. None if the value is not given."""
+    """Returns a value for the JSON document, with datetimes in ISO 8601 form. None if the value is null or empty, a
+    datetime of zeros, or "Null" in a personalized property."""
     value = described["value"]
     if described["type"] == "datetime" and value is not None:
         try:
@@ -28,7 +29,7 @@ def value_of(name, described, place):
 
 
 def given_values(instance):
-    """The properties of an instance that have a value."""
+    """Returns the properties of an instance that have a value."""
     values = {name: value_of(name, described, instance["path"]["uri"])
               for name, described in instance["properties"].items() if name not in OMITTED}
     return {name: value for name, value in values.items() if value is not None}
@@ -39,7 +40,7 @@ def instances(class_name):
 
 
 def single(class_name):
-    """The first instance of a class that always has one."""
+    """Returns the first instance of a class that must have at least one."""
     found = instances(class_name)
     if not found:
         raise Unreadable(f"There is no instance of {class_name}. Check the agent's configuration and log.")
@@ -47,7 +48,8 @@ def single(class_name):
 
 
 def checked_instances(kind, directory, files):
-    """Returns the leases or the warranties; they must be those of the file."""
+    """Returns the leases or the warranties.
+    @throws Unreadable if they are not the records of the file, or two have the same InstanceID"""
     path = directory / kind.file
     found = instances(kind.class_name)
     identifiers = [each["path"]["keys"]["InstanceID"]["value"] for each in found]
@@ -76,8 +78,9 @@ def read_all(directory, files):
 
 
 def consistently(read):
-    """Reads again if another process changes the data files meanwhile.
-    @param read  a function of the data directory and the content of the files"""
+    """Calls a function that reads data. Repeats the call if another process has changed the data files meanwhile.
+    @param read  the function; receives the data directory and the content of the files
+    @throws Unreadable if the function throws it, or if the files change too often"""
     directory = datafiles.data_directory()
     for _ in range(ATTEMPTS):
         files = datafiles.contents(directory)
@@ -96,12 +99,12 @@ def consistently(read):
 
 
 def read_machine():
-    """All data of the machine.
+    """Returns all data of the machine.
     @throws Unreadable"""
     return consistently(read_all)
 
 
 def read_instances(kind):
-    """The leases or the warranties, as cimhost returns them.
+    """Returns the leases or the warranties, as cimhost returns them.
     @throws Unreadable"""
     return consistently(lambda directory, files: checked_instances(kind, directory, files))

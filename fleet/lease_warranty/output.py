@@ -16,9 +16,9 @@ def mode_of(path):
 
 
 def replace_file(path, text, mode=None):
-    """Writes a file. A reader, also after a crash, finds the old or the new content.
+    """Replaces a file. A reader finds either the old or the new content, even after a crash.
 
-    @param mode  if omitted, that of the old file, or that of new files of this process
+    @param mode  mode of the new file; if omitted, the mode of the old file, or if there is none, the default mode
     """
     path = pathlib.Path(path)
     descriptor, temporary = tempfile.mkstemp(dir=path.parent, prefix=f".{path.name}.new-")

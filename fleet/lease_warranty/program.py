@@ -1,4 +1,4 @@
-"""Exit status of the tools: 0 for success, 1 with the reason if the tool failed, 2 for wrong usage."""
+"""Command-line options and exit status of the tools: 0 for success, 1 for a failure, 2 for wrong usage."""
 
 import argparse
 import os
@@ -17,7 +17,7 @@ def new_parser(name, description):
 def add_unit_options(parser):
     for kind in KINDS.values():
         parser.add_argument(f"--{kind.name}-unit", choices=terms.UNITS, default="months",
-                            help=f"unit of {kind.term}; months and years are those of the calendar (default: months)")
+                            help=f"unit of {kind.term}: calendar months (default), days, weeks or calendar years")
 
 
 def units_of(arguments):
@@ -25,10 +25,10 @@ def units_of(arguments):
 
 
 def run(main, name):
-    """Runs the main function and ends the process."""
+    """Runs the main function. On failure, prints the reason and exits with status 1."""
     try:
         main()
     except (Unreadable, OSError, UnicodeError) as error:
         print(f"{name}: {error}", file=sys.stderr)
-        os.dup2(os.open(os.devnull, os.O_WRONLY), 1)  # otherwise Python writes again, and ends with 120 if that fails
+        os.dup2(os.open(os.devnull, os.O_WRONLY), 1)  # otherwise Python exits with 120 if it cannot flush the output
         sys.exit(1)

@@ -1,4 +1,4 @@
-"""CIM datetimes, and the end of a term that begins at one."""
+"""Converts CIM datetimes and calculates the end of a term."""
 
 import calendar
 import datetime
@@ -9,8 +9,8 @@ UNITS = ("months", "days", "weeks", "years")
 
 
 def from_cim(text):
-    """The time of a CIM datetime; None for one of zeros, which means that there is no date.
-    @throws ValueError for a string that is no date"""
+    """Returns the time of a CIM datetime; None if all its digits are zeros, which means that no date is set.
+    @throws ValueError if the string is not a date"""
     match = CIM_DATETIME.fullmatch(text)
     if not match:
         raise ValueError(f"{text} is not a CIM datetime")
@@ -23,8 +23,8 @@ def from_cim(text):
 
 
 def to_cim(text):
-    """Converts a date or time in ISO 8601 form to a CIM datetime, in UTC if it has no offset. Accepts CIM datetimes, too.
-    @throws ValueError for a string that is neither"""
+    """Converts a date or time in ISO 8601 form, or a CIM datetime, to a CIM datetime. The default offset is UTC.
+    @throws ValueError if the string has neither form"""
     time = from_cim(text) if CIM_DATETIME.fullmatch(text) else datetime.datetime.fromisoformat(text)
     if time is None:
         return text
@@ -33,7 +33,8 @@ def to_cim(text):
 
 
 def plus_months(start, count):
-    """The same day of the month, or its last day if it has no such day."""
+    """Returns the same day in a later month, or the last day of that month if it has no such day.
+    @throws OverflowError after the year 9999"""
     year, month = divmod(start.year * 12 + start.month - 1 + count, 12)
     if year > datetime.MAXYEAR:
         raise OverflowError
@@ -41,7 +42,7 @@ def plus_months(start, count):
 
 
 def end_of(start, count, unit="months"):
-    """The end of a term. None without a start or a length, or if no calendar has a date for it."""
+    """Returns the end of a term. None without a start or a length, or if the end is after the year 9999."""
     if start is None or not count:
         return None
     try:
@@ -53,7 +54,7 @@ def end_of(start, count, unit="months"):
 
 
 def period(kind, record, unit):
-    """Start and end of a record; each is None if it is not given."""
+    """Returns the start and the end of a record; None for each that the record does not determine."""
     text = record.get(kind.start)
     start = datetime.datetime.fromisoformat(text) if text else None
     return start, end_of(start, record.get(kind.term), unit)

@@ -1,11 +1,12 @@
 "use strict";
-// The page of lease-warranty-report. The data are in the element "data": see content() in that program.
+// The script of the page that lease-warranty-report writes. The element "data" has the result of the program's function
+// content().
 
 const data = JSON.parse(document.getElementById("data").textContent);
 const today = Date.parse(data.today);
 const DAY = 86400000;
-const PAGE = 100; // rows that are added at once
-const MONTHS_BEFORE = 6, MONTHS_AFTER = 36; // of the time line
+const PAGE = 100; // number of rows that are added at once
+const MONTHS_BEFORE = 6, MONTHS_AFTER = 36; // range of the time line
 const MONTH_NAMES = ["Jan", "Feb", "Mar", "Apr", "May", "Jun", "Jul", "Aug", "Sep", "Oct", "Nov", "Dec"];
 const STATES = { "": "any", over: "over", soon: "ends soon", later: "ends later", open: "no end on record",
   none: "none on record" };
@@ -21,7 +22,7 @@ function element(name, text, attributes = {}) {
 
 // --- machines ---
 
-// The record that ends last counts; one without an end ends after all others.
+// Returns the record that ends last. A record without an end counts as later than all others.
 function latest(records) {
   return records.reduce((best, each) => (!best || (best.end && (!each.end || each.end > best.end)) ? each : best), null);
 }
@@ -53,7 +54,7 @@ const machines = data.machines.map(machineOf);
 const monthOf = (date) => Number(date.slice(0, 4)) * 12 + Number(date.slice(5, 7)) - 1;
 const firstMonth = monthOf(data.today) - MONTHS_BEFORE, lastMonth = monthOf(data.today) + MONTHS_AFTER;
 
-// The bar of a record: a month, or one of the two bars for all that ends before and after.
+// The bar of a record: that of its month, or one of the two bars for records that end before or after the time line.
 const barOf = (record) => Math.min(Math.max(monthOf(record.end), firstMonth - 1), lastMonth + 1);
 
 const isMonth = (month) => month >= firstMonth && month <= lastMonth;
@@ -97,7 +98,7 @@ function barElement(month, { lease, warranty }, most) {
 
 function showTimeline() {
   const counts = countsByBar();
-  // The two bars of the rest may be far higher than any month: they do not determine the scale.
+  // The bars for earlier and later months can be far higher than those of the months, so they do not affect the scale.
   const most = Math.max(1, ...[...counts].map(([month, each]) => (isMonth(month) ? each.lease + each.warranty : 0)));
   byId("scale").textContent = `per month, at most ${most}`;
   byId("timeline").replaceChildren(...[...counts].map(([month, each]) => barElement(month, each, most)));
@@ -118,7 +119,7 @@ const COLUMNS = [
 ];
 let order = { column: 0, direction: 1 };
 let month = null; // the selected bar
-let shown = []; // the machines that pass the filters, in their order
+let shown = []; // the machines that pass the filters, in the selected order
 let rowCount = 0;
 
 function endCell(machine, column) {
@@ -145,7 +146,7 @@ function addRows(count) {
   byId("more").hidden = rowCount >= shown.length;
 }
 
-// Machines without a value come last in either direction.
+// Machines without a value are last in either sort direction.
 function inOrder(list) {
   const { key } = COLUMNS[order.column];
   return list.map((machine) => [key(machine) || "", machine]).sort(([one, a], [other, b]) =>
@@ -203,7 +204,7 @@ function listen() {
   byId("filters").addEventListener("submit", (event) => event.preventDefault());
   byId("filters").addEventListener("reset", () => {
     month = null;
-    setTimeout(update); // when the controls have their first values again
+    setTimeout(update); // after the browser has reset the controls
   });
   byId("timeline").addEventListener("click", (event) => {
     const bar = event.target.closest(".bar");

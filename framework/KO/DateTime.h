@@ -18,7 +18,7 @@ public:
     DateTime();
 
     /**
-     * Creates a date from the clock. A time outside the years 0 to 9999 is unset.
+     * Creates a date from a clock time. A time outside the years 0 to 9999 yields an unset date.
      * @param seconds seconds since 1970-01-01 00:00 UTC, as returned by time()
      * @param kind 3 for local time with its offset, any other number for UTC
      */

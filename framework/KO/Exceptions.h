@@ -10,8 +10,8 @@ namespace KO {
 /**
  * Declares an exception class with an English message.
  *
- * The exceptions are thrown by value and caught by reference in other libraries: the provider, the framework and the
- * logging library. They therefore have default visibility.
+ * An exception can be caught in another library than the one that throws it. The classes therefore have default
+ * visibility.
  */
 #define KO_EXCEPTION_CLASS(Name)                                               \
     class KO_EXPORT Name : public std::exception {                             \

@@ -10,10 +10,10 @@ namespace KO {
 /** Modes of File::open and PropertyFile::open. */
 enum FileMode : unsigned long {
     FILE_MODE_READ = 1,   ///< for reading; the file must exist
-    FILE_MODE_WRITE = 3,  ///< for writing; created if it does not exist, never truncated by opening
+    FILE_MODE_WRITE = 3,  ///< for writing; a missing file is created, an existing file is not truncated
 };
 
-/** A file of the agent, named by a wide path. */
+/** A file of the agent, identified by a path of wide characters. */
 class KO_EXPORT File {
 public:
     /** The path of a file. Copies are independent. */
@@ -41,7 +41,8 @@ public:
     File& operator=(const File&) = delete;
 
     /**
-     * Opens the file in a FileMode; mode 3 creates an empty file if there is none. Closes the file first if it is open.
+     * Opens the file in a FileMode. FILE_MODE_WRITE creates an empty file if there is none. If the file is already
+     * open, reopens it; if that fails, it stays open in the old mode.
      * @throws FrameworkException with the reason, if the file cannot be opened or is not a regular file
      */
     void open(unsigned long mode);

@@ -53,7 +53,7 @@ public:
      */
     std::string convertPathToString(const std::string& path);
 
-    /** Inverse of convertPathToString. Returns a string that is not the string form of a path unchanged. */
+    /** Inverse of convertPathToString. If a string is not the string form of a path, returns it unchanged. */
     std::string convertStringToPath(const std::string& text);
 
 private:

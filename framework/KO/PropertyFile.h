@@ -12,7 +12,7 @@ class Utils;
 /**
  * A file of named string values. KO::Utils reads and writes its entries.
  *
- * Entries keep their order; unchanged entries keep their values. If anything was written, close() replaces the file
+ * Entries keep their order; unchanged entries keep their values. If an entry was written, close() replaces the file
  * atomically: concurrent readers, and readers after a crash, see either the old or the new content.
  */
 class KO_EXPORT PropertyFile {
@@ -20,14 +20,14 @@ public:
     /** Sets the path without opening the file. */
     explicit PropertyFile(const File::Path& path);
 
-    /** Discards unwritten changes if close() was not called. */
+    /** Discards changes that close() has not written. */
     ~PropertyFile();
     PropertyFile(const PropertyFile&) = delete;
     PropertyFile& operator=(const PropertyFile&) = delete;
 
     /**
      * Reads the complete file. FILE_MODE_READ requires it to exist; FILE_MODE_WRITE creates an empty file if there is
-     * none. Discards the changes since an earlier open() without close().
+     * none. Discards changes that close() has not written.
      * @throws FrameworkException if the file cannot be opened or read
      */
     void open(unsigned long mode);

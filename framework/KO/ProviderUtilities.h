@@ -16,7 +16,7 @@ class Moniker;
  *
  * Arguments are borrowed. New object paths and instances are created through the broker, which owns them; the caller
  * must not release them. The functions never throw and never crash on a null pointer, a missing or failing broker
- * function or a value of an unexpected type: reading functions then return that there is no value, creating functions
+ * function or a value of an unexpected type: reading functions then report that there is no value, creating functions
  * return null, and writing functions do nothing.
  */
 class KO_EXPORT ProviderUtilities {
@@ -95,8 +95,8 @@ public:
     ///@}
 
     /**
-     * Appends the path's keys to a moniker, in the path's order. Converts integer and boolean keys to strings and omits
-     * keys of other types.
+     * Appends the path's keys to a moniker, in the path's order. Converts integer and boolean keys to strings. Omits
+     * keys that are neither strings nor integers nor booleans.
      */
     static void transformObjectPathToMoniker(const CMPIObjectPath* path, Moniker& moniker);
 

@@ -17,7 +17,7 @@ namespace KO {
 /** Converts a wide string to a narrow one. A code point that UTF-8 cannot encode becomes U+FFFD. */
 KO_EXPORT std::string make_string(const std::wstring& text);
 
-/** Copies a narrow string, usable as a file path. A null pointer yields the empty string. */
+/** Copies a narrow string. A null pointer yields the empty string. */
 KO_EXPORT std::string make_string(const char* text);
 
 /** Converts a narrow string to a wide one. */

@@ -35,13 +35,13 @@ public:
     static void WriteDateToFile(PropertyFile& file, const std::string& key, const DateTime& value);
 
     /**
-     * Converts a date to a CIM datetime string of 25 characters, yyyymmddhhmmss.mmmmmmsutc, in the date's offset. An
+     * Converts a date to a CIM datetime string of 25 characters, yyyymmddhhmmss.mmmmmmsutc, with the date's offset. An
      * unset date yields "00000000000000.000000-000".
      */
     static std::string convertCIMDateTime(DateTime value);
 
     /**
-     * Converts a CIM datetime string to a date; an unset date if the string is not valid or is an interval.
+     * Converts a CIM datetime string to a date. A string that is invalid or an interval yields an unset date.
      * convertCIMDateTime() returns the original string of a valid date.
      */
     static DateTime convertStringToDateTime(std::string text);

@@ -16,12 +16,12 @@ public:
     /**
      * Writes one record to the log channel.
      * @param function plain name of the reporting function
-     * @param file its source file
-     * @param line its line number
+     * @param file name of the source file
+     * @param line line number in the source file
      * @param logger name of the logger, for example "Tarvik.LeaseAndWarrantyProvider"
      * @param level 3000 error, 4000 trace of control flow, 6000 detail
      * @param extra reserved, like the two numbers after it: pass null, 0, 0
-     * @param text the message; control characters are made visible when it is written
+     * @param text the message; the log escapes control characters
      */
     static void logLevelMessage(const char* function, const char* file, int line, const std::string& logger, int level,
                                 char* extra, int, int, const std::string& text);
@@ -31,8 +31,8 @@ public:
                                   int level, char* extra, int, int, const std::string& text);
 
     /**
-     * Returns whether a record of a level may be written to one of the channels. If not, callers can omit the record
-     * and its formatting. Fast, and never throws.
+     * Returns whether at least one of the channels may write a record of this level. If not, callers can omit the
+     * record and its formatting. Fast, and never throws.
      *
      * The function is optional: it is declared weak, so callers must check that its address is not null.
      */

@@ -29,8 +29,8 @@ public:
     operator std::ostream&();
 
     /** @name Taking the message
-     * Returns the string that was inserted since the last call and clears the buffer for the next message. The argument
-     * is this buffer, or the stream that its operator<< returned.
+     * Returns the message that was inserted since the last call, and clears the buffer for the next message. The
+     * argument is this buffer, or the stream that its operator<< returned.
      */
     ///@{
     std::string str(RZMessageBuffer& buffer);
@@ -43,7 +43,7 @@ private:
 };
 
 /**
- * Appends a value that is not a C string in its stream format: a std::string as its characters, a pointer as its
+ * Appends a value of any type except C strings, in its stream format: a std::string as its characters, a pointer as its
  * address, an enumeration as its number. @return the stream, for inserting more
  */
 template <class Value, class = std::enable_if_t<!std::is_convertible_v<const Value&, const char*>>>

@@ -9,14 +9,14 @@ from ansible.module_utils.lease_warranty.kinds import KINDS
 DOCUMENTATION = """
 module: lease_warranty_record
 short_description: sets a lease or a warranty of the machine
-description: Creates the record if it is missing, changes the given properties that differ, and reads them again.
+description: Creates the record if it is missing, changes the given properties that differ, and checks the result.
 options:
   kind:
     description: the kind of record
     choices: [lease, warranty]
     required: true
   instance_id:
-    description: the InstanceID; by default that of the record which belongs to the computer
+    description: the InstanceID; the default is that of the record that belongs to the computer
     default: /system/computer
   values:
     description: properties of VELKO_Lease or VELKO_Warranty; dates as 2026-01-31 or as CIM datetimes
@@ -26,7 +26,8 @@ options:
 
 
 def wanted(kind, values):
-    """Converts the values to the types that the class declares, in the form that cimhost uses."""
+    """Converts the values to the types that the class declares, in the form in which cimhost returns them.
+    @throws ValueError for an unknown property, or a value that does not have its type"""
     declared, = [each for each in query("classes") if each["class"] == kind.class_name]
     types = {each["name"]: each["type"] for each in declared["properties"] if each["writable"]}
     unknown = sorted(set(values) - set(types))
@@ -47,7 +48,8 @@ def converted(name, kind, value):
 
 
 def current(kind, instance_id):
-    """The values of the record; None if there is no such record. Damaged data are refused, not overwritten."""
+    """Returns the values of the record; None if there is no such record.
+    @throws Unreadable if the data are damaged, so that they are not overwritten"""
     for each in machine.read_instances(kind):
         if each["path"]["keys"]["InstanceID"]["value"] == instance_id:
             return {name: described["value"] for name, described in each["properties"].items()}
@@ -70,7 +72,7 @@ def text_of(value):
 
 
 def store(kind, instance_id, record, values):
-    """Sends the values, and reads them again: without the gate, the provider reports success in any case."""
+    """Sends the values, then reads and compares them, since the provider without the gate always reports success."""
     escaped = instance_id.replace("\\", "\\\\").replace('"', '\\"')
     path = f'{kind.class_name}.InstanceID="{escaped}"'
     if record is None:

@@ -8,13 +8,13 @@ from ansible.plugins.lookup import LookupBase
 DOCUMENTATION = """
 name: csv_row
 short_description: the row of a CSV file for a machine, as a dictionary
-description: The first line has the names of the columns. Empty cells are left out.
+description: The first line has the names of the columns. Empty cells are omitted.
 options:
   _terms:
-    description: path of the file, seen from the current directory
+    description: path of the file, absolute or relative to the current directory
     required: true
   machine:
-    description: value of the column C(machine) in the wanted row; there must be exactly one
+    description: value of the column C(machine) in the wanted row; exactly one row must have it
     required: true
 """
 
