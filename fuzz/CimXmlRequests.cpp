@@ -305,8 +305,7 @@ private:
         }
     }
 
-    /** Sometimes sends a pull of the other kind, or closes the enumeration. @return whether the enumeration is closed
-     */
+    /** Sometimes sends a pull of the other kind, or closes the enumeration. @return whether it is now closed */
     bool isClosed(bool ofPaths, const std::string& nameSpace, const std::string& context) {
         const std::size_t choice = bytes.below(8);
         if (choice == 1) {

@@ -76,8 +76,7 @@ Records recordsOf(const Store& store) {
     return records;
 }
 
-/** Whether a valid call's values can be stored: records lose strings of one character, and asset data lose intervals.
- */
+/** Whether a valid call's values can be stored: records lose strings of one character, asset data lose intervals. */
 bool canBeStored(const Call& call, bool isRecord) {
     const auto& values = call.request.instance.properties;
     return std::all_of(values.begin(), values.end(), [&](const cimhost::NamedValue& each) {

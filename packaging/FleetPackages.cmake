@@ -31,7 +31,7 @@ law_package(metrics lease-warranty-metrics
 A timer and a service that write start and end of leases and warranties, asset
 identification and agent identity for the textfile collector of
 prometheus-node-exporter.")
-# Not recommended: it listens on the network.
+# Only suggested, because node_exporter listens on the network.
 set(CPACK_DEBIAN_METRICS_PACKAGE_SUGGESTS prometheus-node-exporter)
 
 law_package(report lease-warranty-report
@@ -39,5 +39,5 @@ law_package(report lease-warranty-report
     DEPENDS "${needs_common}"
     DESCRIPTION "report on the leases and warranties of many computers
 The command lease-warranty-report reads Ansible's facts cache, or JSON that
-lease-warranty-export wrote on each computer, and writes one HTML page: what
-ends when, a table to sort and filter, computers without data.")
+lease-warranty-export wrote on each computer, and writes one HTML page: a time
+line of end dates, a table to sort and filter, and computers without data.")
