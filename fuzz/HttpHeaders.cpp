@@ -124,7 +124,8 @@ ModelRequest modelFrom(Bytes bytes) {
     return model;
 }
 
-/** Checks every combination of values of one header and one other header. All remaining headers have their first value.
+/**
+ * Checks every combination of values of one header and one other header. All remaining headers keep their first value.
  */
 void requirePairs(ModelRequest model, std::size_t one) {
     const auto& rows = headerRows();
