@@ -37,7 +37,7 @@ void AgentDirectory::removeRecords() const {
     }
 }
 
-/** A stream writes paths in quotes, as TOML requires. */
+/** The operator << writes paths in quotes, as TOML requires. */
 void AgentDirectory::writeConfiguration(const fs::path& file) const {
     std::ofstream stream(file);
     stream << "[directories]\ndata = " << data() << "\ninstall = " << root << "\n[product]\nname = \"" << names::agent

@@ -6,7 +6,7 @@ namespace bench {
 
 /**
  * A temporary directory with an agent's data and a configuration that disables the log. Construct it before the agent's
- * libraries are loaded, since it sets their environment variable.
+ * libraries are loaded, since it sets OSTREL_CONFIG, which they read.
  */
 class AgentDirectory {
 public:

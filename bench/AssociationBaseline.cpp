@@ -39,7 +39,7 @@ CMPIEnumeration* computers(const AssociationBaseline& baseline, const CMPIContex
     return baseline.broker->bft->enumerateInstances(baseline.broker, context, path, nullptr, nullptr);
 }
 
-/** Returns the lease of the computer with this path. @param make makes its path or instance */
+/** Returns the lease of the computer with this path. @param make returns the lease's path or instance */
 template <class Make>
 void returnLease(const AssociationBaseline& baseline, const CMPIResult* result, const CMPIObjectPath* path, Make make) {
     const std::string wanted = stringKey(path, "Name") == names::computer ? names::computerNode : "";

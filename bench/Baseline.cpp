@@ -124,7 +124,7 @@ CMPIStatus deleteInstance(CMPIInstanceMI* mi, const CMPIContext*, const CMPIResu
     return success;
 }
 
-/** Products cannot be created, modified or deleted. */
+/** The baseline of a product class has no operations that change instances. */
 template <class Row>
 CMPIInstanceMIFT baselineTable() {
     if constexpr (isRecord<Row>) {

@@ -10,11 +10,11 @@
 #include "Rows.h"
 
 /**
- * The baseline is a loop over plain structs that has the same function tables, makes the same broker calls and returns
- * the same results as the provider. Changes rewrite a file of the provider's format, with a flush per line, as the
- * provider does.
+ * The baseline is a minimal provider that loops over plain structs. It has the same function tables, makes the same
+ * broker calls and returns the same results as the provider. A change rewrites a file in the provider's format and
+ * flushes it after each line, as the provider does.
  *
- * A baseline serves one class and expects only the requests of the benchmarks.
+ * A baseline serves one class and handles only the requests of the benchmarks.
  */
 namespace bench {
 
@@ -25,11 +25,11 @@ public:
     Baseline(const Baseline&) = delete;
     Baseline& operator=(const Baseline&) = delete;
 
-    /** Its interfaces; owned by it. */
+    /** The interfaces, which the baseline owns. */
     virtual Interfaces interfaces() = 0;
 };
 
-/** A baseline for the rows of a table. @param file for changes; unused for products */
+/** A baseline for the rows of a table. @param file the file that changes rewrite; unused for products */
 template <class Row>
 std::unique_ptr<Baseline> makeBaseline(const CMPIBroker* broker, std::vector<Row> rows, std::filesystem::path file);
 

@@ -6,7 +6,7 @@
 
 #include "Rows.h"
 
-/** The broker calls of a response, without checks. */
+/** The broker calls that create a response, without checks for errors. */
 namespace bench {
 
 inline const char* characters(const CMPIString* string) {

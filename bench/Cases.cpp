@@ -12,7 +12,7 @@ namespace {
 using cimhost::ObjectPath;
 using cimhost::Request;
 
-/** Larger tables are not measured behind the gate: its share does not depend on the size. */
+/** Larger tables are not measured behind the gate, because its share of the time does not depend on the size. */
 constexpr std::size_t largestGated = 1000;
 
 /** A case whose baseline has a table of this many rows. The caller sets the provider. */
@@ -40,7 +40,7 @@ Case readCase(std::string operation, std::size_t size, ExpectedRequest request) 
     return one;
 }
 
-/** A case whose request changes the table. Each request finds the initial table and file. */
+/** A case whose request changes the table. Each request starts with the initial table. */
 template <class Row>
 Case writeCase(std::string operation, std::size_t size, ExpectedRequest request) {
     Case one = baselineCase<Row>(std::move(operation), size, std::move(request));
@@ -91,7 +91,7 @@ void addWrites(std::vector<Case>& cases, std::size_t size) {
     cases.push_back(writeCase<Row>("DeleteInstance", size, {Request::deleteInstance(recordOf<Row>(size / 2, size))}));
 }
 
-/** A table larger than in practice; only of leases, whose records are the longer ones. */
+/** Adds the cases of a table larger than in practice. It has leases, whose records are longer than warranties. */
 void addLargest(std::vector<Case>& cases) {
     addEnumerations<LeaseRow>(cases, largestSize);
     addGet<LeaseRow>(cases, "GetInstance.middle", largestSize / 2, largestSize);
@@ -124,7 +124,7 @@ void addProduct(std::vector<Case>& cases) {
 Case associationCase(std::string operation, std::size_t computers, ExpectedRequest request, std::size_t size = 1000) {
     Case one = readCase<LeaseRow>(std::move(operation), size, std::move(request));
     one.className = names::leaseSettingClass;
-    one.twice = nullptr;  // the gate returns other results
+    one.twice = nullptr;  // the gate's results differ from the provider's
     one.computers = computers;
     one.baseline = [size](const Environment&, const CMPIBroker* broker) {
         return makeAssociationBaseline(broker, makeRows<LeaseRow>(size));
@@ -157,7 +157,8 @@ std::vector<Case> associationCases() {
     const Request ofComputer = Request::associators(computer, filter);
     const Request namesOfLease = Request::associatorNames(lease, filter);
     const Request ofLease = Request::associators(lease, filter);
-    // From a lease, the provider omits the last computer: of one computer it returns none, of two the first.
+    // When it starts at a lease, the provider omits the last computer: with one computer it returns none, with two only
+    // the first.
     return {
         associationCase("AssociatorNames.fromComputer", 1, {namesOfComputer, 1}, 10),
         associationCase("AssociatorNames.fromComputer", 1, {namesOfComputer, 1}),

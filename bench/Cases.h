@@ -15,9 +15,9 @@
 namespace bench {
 
 /**
- * A request that is measured with the provider and the baseline. It is registered as three benchmarks, with names of
- * the form Operation[.detail]/Class/provider/size, .../baseline/size and .../both/size, which alternates between the
- * two.
+ * A request that is measured with the provider and the baseline. It is registered as the benchmarks
+ * Operation[.detail]/Class/provider/size, .../baseline/size and .../both/size. The last one alternates between provider
+ * and baseline.
  */
 struct Case {
     std::string operation;
@@ -29,7 +29,7 @@ struct Case {
     std::string changedFile{};  ///< name of the file that the request changes; empty: none
     std::size_t computers = 1;  ///< computers that the object manager has
 
-    /** Loads the provider alone and behind the gate, for a benchmark that alternates between them: .../gate/size. */
+    /** Loads the provider alone and behind the gate. If set, the benchmark .../gate/size alternates between the two. */
     std::function<std::pair<Interfaces, Interfaces>(Environment&)> twice{};
 };
 
@@ -37,7 +37,7 @@ struct Case {
 extern const std::vector<std::size_t> readSizes;
 extern const std::vector<std::size_t> writeSizes;
 
-/** The size of a table that shows whether times are linear: only leases, and few requests. */
+/** The size of a table that shows whether times grow linearly. Only a few requests for leases are measured with it. */
 constexpr std::size_t largestSize = 1000000;
 
 /** @name The cases */
@@ -48,12 +48,12 @@ std::vector<Case> associationCases();
 ///@}
 
 /**
- * Registers the benchmarks of a case. They check each response, and compare the results of the provider with those of
- * the baseline. A wrong response ends the benchmark with an error and sets failed.
+ * Registers the benchmarks of a case. The benchmarks check each response, and compare the provider's results with the
+ * baseline's. A wrong response ends the benchmark with an error and sets failed.
  */
 void registerCase(const Case& one, Environment& environment, bool& failed);
 
-/** Registers the loading of the library, from dlopen to the end of dlclose, and the reading of the file. */
+/** Registers benchmarks that load and unload the library, and that read the record file as the baseline does. */
 void registerLoading(Environment& environment, bool& failed);
 
 }  // namespace bench

@@ -14,7 +14,7 @@
 
 namespace bench {
 
-/** Responds to the provider's requests with the instances of the managed computers. */
+/** Handles the provider's requests to the broker, which may only enumerate the computers. */
 class ComputerSystems : public cimhost::UpCalls {
 public:
     /** Number of computers; the first is the one that the agent manages. */
@@ -26,7 +26,7 @@ public:
 /** Whether the agent's libraries stay loaded when the provider is unloaded. */
 enum class AgentStays { yes, no };
 
-/** The environment of the benchmarks: an agent, a broker and, loaded on demand, the provider. */
+/** The environment of the benchmarks: an agent, a broker, and the provider, which is loaded on demand. */
 class Environment {
 public:
     explicit Environment(AgentStays agentStays = AgentStays::yes);
@@ -44,7 +44,7 @@ public:
         return provider->interfaces();
     }
 
-    /** Loads the provider with this number of records, unless the last call of this function did. */
+    /** Loads the provider with this number of records, unless it is already loaded with them. */
     template <class Row>
     Interfaces loaded(std::size_t size) {
         const std::string wanted = Row::fileName + std::to_string(size);
@@ -74,7 +74,7 @@ public:
 
     /**
      * Unloads the provider and the libraries that it loaded, and removes the records.
-     * @throws std::runtime_error if a library stays loaded that should not
+     * @throws std::runtime_error if a library that must be unloaded is still loaded
      */
     void unload();
 

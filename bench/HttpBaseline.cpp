@@ -1,6 +1,6 @@
 /**
- * Answers every HTTP request with the content of a file, as cimhost serve would send it: the baseline for its speed.
- * Usage: http_baseline FILE. Prints its URL.
+ * Answers every HTTP request with the content of a file, with the HTTP library of cimhost serve. The speed of cimhost
+ * serve is compared with this baseline. Usage: http_baseline FILE. Prints its URL.
  */
 #include <microhttpd.h>
 
@@ -14,7 +14,7 @@ namespace {
 
 MHD_Result answer(void* content, MHD_Connection* connection, const char*, const char*, const char*, const char*,
                   size_t* size, void** context) {
-    if (*context == nullptr || *size != 0) {  // the head, or a part of the body
+    if (*context == nullptr || *size != 0) {  // called for the head or for a part of the body
         *context = content;
         *size = 0;
         return MHD_YES;

@@ -27,7 +27,7 @@ std::string contentOf(const std::filesystem::path& file) {
     return {std::istreambuf_iterator<char>(stream), {}};
 }
 
-/** @throws std::runtime_error unless the changes of provider and baseline resulted in the same file */
+/** @throws std::runtime_error unless the provider and the baseline wrote equal files */
 void requireSameFile(const Environment& environment, const Case& one) {
     if (!one.changedFile.empty() && contentOf(environment.agent().data() / one.changedFile) !=
                                         contentOf(environment.agent().baselineData() / one.changedFile)) {
@@ -78,7 +78,7 @@ double secondsOf(Environment& environment, const ExpectedRequest& request, const
     return response.seconds;
 }
 
-/** The median, which outliers and a coarse clock do not change. */
+/** The median, which outliers and a coarse clock hardly affect. */
 double median(std::vector<double> seconds) {
     const auto half = seconds.begin() + static_cast<std::ptrdiff_t>(seconds.size() / 2);
     std::nth_element(seconds.begin(), half, seconds.end());
@@ -121,7 +121,7 @@ void measureBoth(benchmark::State& state, Environment& environment, const Case& 
     };
     TimedResponse latest;
     const auto timeBaseline = [&] {
-        latest = {};  // frees its memory, so that both sides find the same amount
+        latest = {};  // frees its memory, so that both sides start with the same free memory
         const TimedResponse response = performBaseline();
         requireExpected(one.request, response);
         return response.seconds;
@@ -137,7 +137,7 @@ void measureBoth(benchmark::State& state, Environment& environment, const Case& 
     requireSameFile(environment, one);
 }
 
-/** The provider alone and behind the gate. */
+/** Measures the provider alone and behind the gate. */
 void measureGate(benchmark::State& state, Environment& environment, const Case& one) {
     const auto sides = one.twice(environment);
     const std::unique_ptr<Baseline> baseline = one.baseline(environment, environment.broker().handle());
@@ -147,7 +147,7 @@ void measureGate(benchmark::State& state, Environment& environment, const Case& 
         state, turnsFor(one), "alone", [&] { return time(sides.first); }, "gated", [&] { return time(sides.second); });
 }
 
-/** Registers a benchmark that sets its time. It fails if it throws an exception. */
+/** Registers a benchmark whose body sets the measured time. The benchmark fails if the body throws an exception. */
 void registerBenchmark(const std::string& name, bool& failed, const std::function<void(benchmark::State&)>& body) {
     const auto guarded = [&failed, body](benchmark::State& state) {
         try {
@@ -170,7 +170,7 @@ void measureLoading(benchmark::State& state, Environment& environment, std::size
     const auto perRecord = [&](std::size_t bytes) { return static_cast<double>(bytes) / static_cast<double>(size); };
     state.counters["file_per_record"] = perRecord(std::filesystem::file_size(file));
     for (auto _ : state) {
-        ::malloc_trim(0);  // returns memory that earlier iterations freed
+        ::malloc_trim(0);  // returns to the kernel the memory that earlier iterations freed
         const ProcessResources before = processResources();
         double begin = processorSeconds();
         std::optional<cimhost::LoadedLibrary> library(std::in_place, ProviderEntry::ofProvider().file, libraryFlags);

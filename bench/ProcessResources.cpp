@@ -14,7 +14,7 @@ namespace {
 std::size_t residentBytes() {
     std::size_t pages = 0;
     std::ifstream statm("/proc/self/statm");
-    statm >> pages >> pages;  // the second number is the resident pages
+    statm >> pages >> pages;  // the second number counts the resident pages
     return pages * static_cast<std::size_t>(::sysconf(_SC_PAGESIZE));
 }
 

@@ -18,7 +18,7 @@ bool isLoaded(const std::filesystem::path& file);
 /** A provider that an object manager loads. */
 struct ProviderEntry {
     std::filesystem::path file;
-    std::string name;  ///< prefix of its factories
+    std::string name;  ///< prefix of the names of its factory functions
 
     static ProviderEntry ofProvider();
     static ProviderEntry ofGate();

@@ -9,7 +9,7 @@
 
 #include "cim/DateTime.h"
 
-/** Reads and writes record files without more work than the format requires: streams, escapes, a flush per line. */
+/** Reads and writes record files with only the work that the format requires: streams, escapes, a flush per line. */
 namespace bench {
 
 inline std::string replaced(std::string value, char from, char to) {
@@ -17,7 +17,7 @@ inline std::string replaced(std::string value, char from, char to) {
     return value;
 }
 
-/** Writes the fields of a row, one per line, with a flush per line, as the provider does. */
+/** Writes each field of a row to a line and flushes it, as the provider does. */
 class FieldWriter {
 public:
     explicit FieldWriter(std::ofstream& itsStream) : stream(itsStream) {}

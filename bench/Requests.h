@@ -13,7 +13,7 @@
 /** Timed requests to a provider's function tables. */
 namespace bench {
 
-/** The interfaces of a provider, which owns them; null if it does not have one. */
+/** The interfaces of a provider, which owns them. A member is null if the provider has no such interface. */
 struct Interfaces {
     CMPIInstanceMI* instances = nullptr;
     CMPIAssociationMI* associations = nullptr;
@@ -36,11 +36,12 @@ struct TimedResponse {
 /** The processor time that this thread has used, in seconds. */
 double processorSeconds();
 
-/** Performs a request. Its time does not include creating the arguments and freeing the provider's objects. */
+/** Performs a request. The measured time excludes creating the arguments and freeing the provider's objects. */
 TimedResponse perform(cimhost::Broker& broker, const cimhost::Request& request, const Interfaces& interfaces);
 
 /**
- * Checks the status, the number of results and, of a read that is OK, that the provider called returnDone last.
+ * Checks the status and the number of results. If a read or a creation succeeded, also checks that the provider called
+ * returnDone last.
  * @throws std::runtime_error with the difference
  */
 void requireExpected(const ExpectedRequest& expected, const TimedResponse& response);
@@ -58,7 +59,7 @@ cimhost::ObjectPath recordPath(const std::string& className, const std::string& 
 cimhost::ObjectPath computerPath(const std::string& name);
 cimhost::NamedValue namedString(const std::string& name, const std::string& value);
 
-/** The path of the only instance of a product class, which is not a record. */
+/** The path of the only instance of a product class. */
 template <class Row>
 cimhost::ObjectPath productPath(const Row& row) {
     cimhost::ObjectPath path = classPath(Row::className);
@@ -68,7 +69,7 @@ cimhost::ObjectPath productPath(const Row& row) {
     return path;
 }
 
-/** A creation with the keys of the path only. */
+/** A creation that sets only the keys. */
 cimhost::Request creation(const cimhost::ObjectPath& path);
 
 /** A modification of one property. */

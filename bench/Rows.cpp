@@ -40,7 +40,7 @@ const AssetRow::Stored AssetRow::profileDate{"ZOPMUpdateTime", "USER.ZOPMUpdateT
 
 namespace {
 
-/** One of some strings, in turn. */
+/** Returns the strings in turn as the index grows. */
 template <std::size_t count>
 std::string oneOf(const std::array<const char*, count>& strings, std::size_t index) {
     return strings[index % count];

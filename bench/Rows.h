@@ -147,7 +147,7 @@ struct AssetRow {
         const char* value;
     };
 
-    /** The stored properties. A string and a datetime property may have the same key. */
+    /** The stored properties. DeploymentProfile and DeploymentUpdateTime have the values of profile and profileDate. */
     static const std::array<Stored, 4> owner;
     static const std::array<Stored, 2> asset;
     static const std::array<Stored, 10> personalized;
@@ -192,7 +192,7 @@ struct AssetRow {
             set.date(one.property, one.value);
         }
         stored(location);
-        set.date("LocalDateTime", profileDate.value);  // of the provider, the current time
+        set.date("LocalDateTime", profileDate.value);  // the provider sets the current time
         stored(profile);
         set.date(profileDate.property, profileDate.value);
         set.string("DeploymentProfile", profile.value);
@@ -222,7 +222,7 @@ constexpr const char* leaseSettingClass = "VELKO_LeaseSetting";
  */
 std::string instanceIdOf(std::size_t index, std::size_t size);
 
-/** A table of this many records; the agent and the asset data have one. */
+/** Returns a table of this number of rows; a product class has one row. */
 template <class Row>
 std::vector<Row> makeRows(std::size_t size);
 

@@ -12,7 +12,7 @@ using cimhost::Request;
 
 constexpr std::size_t records = 10;
 
-// One in this many requests is not a read.
+// Mean number of requests per change, per deletion, and per change of the asset data.
 constexpr std::size_t changeEvery = 5;
 constexpr std::size_t deletionEvery = 200;
 constexpr std::size_t assetChangeEvery = 2000;  // each waits for the disk
@@ -37,7 +37,7 @@ ObjectPath assetPath() {
     return productPath(makeRows<AssetRow>(1).front());
 }
 
-/** Calls step this many times, and progress after each tenth of them. */
+/** Calls step this number of times, and progress after each tenth of the calls. */
 template <class Step>
 void inTenths(std::size_t count, const Progress& progress, Step step) {
     for (std::size_t done = 1; done <= count; ++done) {

@@ -14,20 +14,20 @@ namespace bench {
 using Progress = std::function<void(std::size_t done, const ProcessResources& now)>;
 
 /**
- * Sends many requests of all kinds to one provider, in a pseudorandom order that is the same in each run, and checks
- * status and number of results.
+ * Sends many requests of all kinds to one provider, in a pseudorandom order that is the same in each run. Checks the
+ * status and the number of results.
  *
- * There are ten leases and ten warranties. Sometimes, one is created and deleted again. A deleted record stays in the
- * provider's table until the library is unloaded, so memory may grow with deletions only.
+ * The provider has ten leases and ten warranties. Some requests create another record and delete it. A deleted record
+ * stays in the provider's table until the library is unloaded, so memory may grow, but only with each deletion.
  */
 class Soak {
 public:
     Soak(Environment& itsEnvironment, bool behindGate);
 
-    /** Sends requests and reports ten times. @throws std::runtime_error after a wrong response */
+    /** Sends requests and reports progress ten times. @throws std::runtime_error after a wrong response */
     void request(std::size_t count, const Progress& progress);
 
-    /** Loads, uses and unloads the library and the agent's libraries this many times, and reports ten times. */
+    /** Loads, uses and unloads the library and the agent's libraries repeatedly. Reports progress ten times. */
     void cycle(std::size_t count, const Progress& progress);
 
     std::size_t deletions() const { return deleted; }

@@ -1,10 +1,10 @@
-// Measures the cost of durable storage: modifications, creations with values and reads of one among 100 leases.
+// Measures the cost of durable storage: modifies, creates with values and reads one of 100 leases.
 //
 // Usage: durability_benchmark [REQUESTS]
 //
-// Prints microseconds and syncs per request, as medians and means of one run: by the provider alone, through the gate
-// without syncs, through the gate, and through the gate on a disk on which each sync takes a millisecond. The provider
-// ignores the values of a creation, so without the gate a creation with values is a creation and a modification.
+// Prints per request the median time in microseconds and the mean number of syncs: of the provider alone, of the gate
+// without syncs, of the gate, and of the gate on a disk on which each sync takes a millisecond. The provider ignores
+// the values of a creation, so without the gate a creation with values is a creation and a modification.
 
 #include <dlfcn.h>
 #include <fcntl.h>
@@ -68,7 +68,7 @@ constexpr std::size_t leases = 100;
 
 using Requests = std::vector<bench::ExpectedRequest>;
 
-/** A kind of requests, each with another number. */
+/** A kind of request. Its values contain a number that differs per request. */
 struct TimedRequests {
     const char* name;
     Requests (*timed)(int number, bool isGated);
@@ -135,7 +135,7 @@ void measure(bench::Environment& environment, const Case& tested, const TimedReq
         const int syncsBefore = syncCount;
         const double time = timeOf([&] { perform(environment, interfaces, timed); });
         if (index >= 0) {
-            values.push_back(time);  // without the first two, which also create the saved copies
+            values.push_back(time);  // excludes the first two requests, which also create the saved copies
             timedSyncs += syncCount - syncsBefore;
         }
         perform(environment, interfaces, requests.after());
@@ -161,7 +161,7 @@ void run(int count) {
 
 }  // namespace
 
-/** Counts syncs, and omits or delays them. Used instead of the system's function, by the libraries too. */
+/** Replaces the system's fsync in this program and its libraries. Counts syncs, and omits or delays them. */
 extern "C" __attribute__((visibility("default"))) int fsync(int file) {
     static const auto next = reinterpret_cast<int (*)(int)>(dlsym(RTLD_NEXT, "fsync"));
     ++syncCount;

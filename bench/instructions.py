@@ -4,11 +4,11 @@
 usage: bench/instructions.py BUILD_DIRECTORY [--update]
 
 valgrind's callgrind counts the instructions from the call into the function table to its return. The
-figures do not depend on other work of the machine, so that a check can detect a change of a few per
-cent. bench/instructions.json stores the figures of each request. A difference of more than the
-tolerance is a failure, also an improvement: store it with --update.
+figures do not depend on other work of the machine. bench/instructions.json stores the figure of each
+request. A difference of more than 10 % is a failure, even if it is an improvement: store the new figure
+with --update.
 
-The limits of the provider and the gate are checked with the counted figures: see the LIMITS below.
+Also checks the counted figures against the limits of the provider, the gate and the host.
 """
 
 import argparse
@@ -23,10 +23,10 @@ import tempfile
 
 TABLE = pathlib.Path(__file__).resolve().parent / "instructions.json"
 
-# The C library has variants of its string functions for different vector instructions.
+# Figures differ between processors, because the C library has string functions for different vector instructions.
 TOLERANCE = 0.1
 
-# All requests are calls of this function of the host.
+# The host sends each request with a call to this function.
 CALL = "cimhost::callOperation*"
 
 ENUM = ("EnumInstances", "*LeaseAndWarranty_EnumInstances*", CALL)
@@ -37,7 +37,8 @@ MODIFY = ("ModifyInstance", "*LeaseAndWarranty_ModifyInstance*", CALL)
 DELETE = ("DeleteInstance", "*LeaseAndWarranty_DeleteInstance*", CALL)
 LOAD = ("Load", "*RecordCache<*>::RecordCache*", "*readRows*")
 
-# Request with the functions in which instructions of provider and baseline are counted; class; records.
+# Tuples of a request, a class and a number of records. A request names the functions in which the instructions of the
+# provider and of the baseline are counted.
 MEASURED = [
     *((request, f"VELKO_{kind}", size) for kind in ("Lease", "Warranty") for request in (LOAD, ENUM, NAMES, GET)
       for size in (1000, 10000)),
@@ -54,12 +55,12 @@ GATE_TURNS = 10
 # Highest ratio of provider to baseline.
 RATIO_LIMITS = {("EnumInstances", "VELKO_Lease", 1000): 3.0}
 
-# The most that the gate may add: a share of the provider's instructions; and 10 microseconds at one instruction per
-# nanosecond.
+# The most that the gate may add: as a share of the provider's instructions, and as a number of instructions, which take
+# 10 microseconds at one instruction per nanosecond.
 GATE_PART_LIMITS = {("EnumInstances", "VELKO_Lease", 1000): 0.05}
 GATE_LIMITS = {("GetInstance.middle", "VELKO_Lease", 10): 10000}
 
-# The host's objects: the baseline with the allocator that cimhost links, and the most instructions per instance.
+# The host's objects are counted with the baseline and the allocator that cimhost links. The limit is per instance.
 HOST = (ENUM, "VELKO_Lease", 1000)
 HOST_ALLOCATOR = "libjemalloc.so.2"
 HOST_LIMIT = 12000
@@ -69,7 +70,7 @@ GROWTH_LIMIT = 1.1
 
 
 def count(program, request, function, preloaded=""):
-    """The instructions of one request in the functions that match a pattern."""
+    """Returns the instructions of one request in the functions that match a pattern."""
     with tempfile.TemporaryDirectory() as directory:
         command = ["valgrind", "--tool=callgrind", "--compress-strings=no",
                    f"--callgrind-out-file={directory}/out", f"--toggle-collect={function}", str(program),
@@ -88,7 +89,7 @@ def added_by_gate(gated, all_calls, baseline):
 
 
 def measure(program):
-    """{request name: instructions} of provider and baseline; with the side gate, what the gate adds."""
+    """Returns {request name: instructions}. The side of a name is provider, baseline, host, or gate: what the gate adds."""
     work = []
     for (operation, provider, baseline), class_name, size in MEASURED:
         for side, function in (("provider", provider), ("baseline", baseline)):
@@ -154,9 +155,9 @@ def broken_limits(counts):
 def differences(counts, stored):
     for name in sorted(counts.keys() | stored.keys()):
         if name not in counts or name not in stored:
-            yield f"{name}: is only {'counted' if name in counts else 'stored'}"
+            yield f"{name}: {'counted, but not stored' if name in counts else 'stored, but not counted'}"
         elif abs(counts[name] - stored[name]) > TOLERANCE * stored[name]:
-            yield f"{name}: {counts[name]:,} instructions, stored are {stored[name]:,} ({counts[name] / stored[name] - 1:+.1%})"
+            yield f"{name}: {counts[name]:,} instructions; {stored[name]:,} are stored ({counts[name] / stored[name] - 1:+.1%})"
 
 
 def main():

@@ -33,9 +33,9 @@ bool run() {
 }  // namespace
 
 int main(int argc, char** argv) {
-    // Keep freed memory in the process; otherwise the time of large responses includes the kernel's work for it.
+    // Keep freed memory in the process; otherwise the time of large responses includes requesting it from the kernel.
     mallopt(M_TRIM_THRESHOLD, std::numeric_limits<int>::max());
-    // Merge freed blocks at once; otherwise some request merges those of earlier ones.
+    // Merge freed blocks at once; otherwise a request may merge the blocks that earlier requests freed.
     mallopt(M_MXFAST, 0);
     benchmark::Initialize(&argc, argv);
     if (benchmark::ReportUnrecognizedArguments(argc, argv)) {

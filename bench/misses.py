@@ -3,8 +3,8 @@
 
 usage: bench/misses.py BUILD_DIRECTORY
 
-valgrind's callgrind simulates the caches, so the figures do not depend on the machine. Its caches are small, so that
-10,000 leases overflow them as 1,000,000 do those of a real processor.
+valgrind's callgrind simulates the caches, so the figures do not depend on the machine. The simulated caches are small:
+10,000 leases exceed them as 1,000,000 leases exceed the caches of a real processor.
 """
 
 import argparse
@@ -23,7 +23,7 @@ SIZES = (100, 1000, 10000)
 
 
 def events(program, request, function):
-    """{event: count} in the functions that match a pattern, with callgrind's names of events."""
+    """Returns {event: count} in the functions that match a pattern. The events have callgrind's names."""
     with tempfile.TemporaryDirectory() as directory:
         command = ["valgrind", "--tool=callgrind", "--cache-sim=yes", *CACHES, "--compress-strings=no",
                    f"--callgrind-out-file={directory}/out", f"--toggle-collect={function}", str(program),
@@ -37,7 +37,7 @@ def events(program, request, function):
 
 
 def row(one, size, counted):
-    """Instructions, data accesses, and misses of the first and last cache, all per record."""
+    """Returns a table row with instructions, data accesses, and misses of the first and last cache, all per record."""
     accesses, first, last = (sum(counted[event] for event in names)
                              for names in (("Dr", "Dw"), ("D1mr", "D1mw"), ("DLmr", "DLmw")))
     cells = " | ".join(f"{number / size:,.1f}" for number in (counted["Ir"], accesses, first, last))

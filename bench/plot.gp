@@ -1,4 +1,4 @@
-# Draws the times of bench/report.py: gnuplot -e "data='FILE'; picture='FILE'" bench/plot.gp
+# Draws the times that bench/report.py measured. Usage: gnuplot -e "data='FILE'; picture='FILE'" bench/plot.gp
 set terminal svg size 760,460 font "sans-serif,13" background "white"
 set output picture
 set datafile missing "-"

@@ -29,7 +29,7 @@ HEAD = "<!-- Written by script/benchmark. -->\n\n# Performance figures\n\n"
 SIDES = ("provider", "baseline")
 NOT_SHOWN = {100, 100000}  # numbers of records that only the picture shows
 # Loading is timed separately, other requests alternately with the baseline. Searches are also timed separately, because
-# the baseline walks over the table, which then fills the processor's caches.
+# the baseline scans its table, which then replaces the provider's data in the processor's caches.
 TIMED = "^Load/|/both/|/gate/|^(GetInstance|AssociatorNames.fromComputer).*/provider/"
 # Limits of the time per record in the largest table: name, operation, and the work that determines the time.
 LARGEST = (("Enumerating leases", "EnumInstances", "the object manager's instances"),
@@ -66,7 +66,7 @@ def measured(results):
     for case, sizes in cases.items():
         for size, times in sizes.items():
             if not set(SIDES) <= set(times):
-                sys.exit(f"{case} with {size} records has not both sides")
+                sys.exit(f"{case} with {size} records lacks the provider or the baseline")
     return cases
 
 
@@ -83,7 +83,7 @@ def ratio_text(times):
 
 
 def is_end(case):
-    """Returns whether a case gets the first or last record, which takes the time of the middle one."""
+    """Returns whether a case gets the first or last record, which takes the same time as getting the middle one."""
     return case[0].endswith((".first", ".last"))
 
 
@@ -102,7 +102,8 @@ def table_by_size(cases, cell, head):
 
 
 def requests_tables(cases):
-    """Returns two tables of the provider's times and their ratio to the baseline's: for several sizes and for one."""
+    """Returns the provider's times and their ratio to the baseline's: a table of requests with several sizes, and one
+    of requests with a single size."""
     def cell(times):
         return f"{time_text(times['provider'])} ({ratio_text(times)})"
     several = {case: by_size for case, by_size in cases.items() if len(by_size) > 1 and not is_end(case)}
@@ -236,10 +237,10 @@ def main():
     parser = argparse.ArgumentParser(description="Runs the benchmarks and reports their figures.")
     parser.add_argument("build_directory", type=pathlib.Path)
     parser.add_argument("--min-time", type=float, default=0.1, metavar="SECONDS",
-                        help="how long each benchmark runs at least")
+                        help="minimum time of each benchmark")
     parser.add_argument("--runs", type=int, default=1, metavar="N",
-                        help="how often everything is run; the best time of each is kept")
-    parser.add_argument("--print", action="store_true", help="leave the document alone")
+                        help="number of runs; reports the best time of each benchmark")
+    parser.add_argument("--print", action="store_true", help="print the figures and write no file")
     arguments = parser.parse_args()
     program = arguments.build_directory / "bin" / "provider_benchmark"
     results = [run(program, arguments.min_time) for _ in range(arguments.runs)]
@@ -253,7 +254,7 @@ def main():
         DOCUMENT.write_text(HEAD + text, encoding="utf-8")
     broken = [f"{limit.what}: {limit.measured:.3g}, at most {limit.at_most:g}" for limit in limits if limit.is_broken]
     if broken:
-        sys.exit("Limits that can be kept were missed:\n" + "\n".join(broken))
+        sys.exit("Reachable limits were missed:\n" + "\n".join(broken))
 
 
 if __name__ == "__main__":

@@ -1,9 +1,9 @@
 #!/usr/bin/env python3
 """Sends mixed requests to a CIM server from several clients, and compares each response with a model of the leases.
 
-Each client has one connection and its own leases, which it creates, modifies and deletes. No other program may change
-leases meanwhile. The memory, open files and threads of the server have grown if each sample of the last quarter of the
-time exceeds all those of the second quarter. The memory of deleted leases is not counted.
+Each client has one connection and its own leases, which it creates, modifies and deletes. No other program must change
+leases during the test. The memory, open files or threads of the server have grown if every sample of the last quarter
+of the run exceeds every sample of the second quarter by more than a limit. The memory of deleted leases is not counted.
 
 Exit status: 0 all responses were right and nothing has grown; 1 otherwise; 2 wrong usage.
 """
@@ -61,7 +61,7 @@ def parts_in(response):
 
 
 class Facts:
-    """The leases that never change, and responses that depend on them alone."""
+    """The leases that never change, and the responses that depend only on these leases."""
 
     def __init__(self, server):
         for name in names_in(server.ask("EnumerateInstanceNames", LEASES)):
@@ -127,7 +127,7 @@ class SoakClient(threading.Thread):
             self.statistics.report(f"client {self.number}: {what}: {found!r} instead of {expected!r}"[:1000])
 
     def check_names(self, what, names):
-        """The names are those of the facts, of this client's leases, and of other clients' leases."""
+        """Checks the names of all leases. Of other clients' leases, only checks that each name occurs once."""
         mine = f"{CREATED}{self.number}-"
         self.check(f"{what}: number of different names", len(set(names)), len(names))
         self.check(f"{what}: created", sorted(name for name in names if name.startswith(mine)), sorted(self.leases))
@@ -239,13 +239,13 @@ def resources_of(pid):
 
 
 def growth_of(samples):
-    """Returns how much the last quarter of the samples exceeds the second, at least."""
+    """Returns the smallest sample of the last quarter minus the largest sample of the second quarter."""
     quarter = len(samples) // 4
     return min(samples[-quarter:]) - max(samples[quarter:2 * quarter]) if quarter else 0
 
 
 def grown(samples, most_memory):
-    """Returns the resources that have grown, with their growth. The server opens files for short times."""
+    """Returns the resources that have grown, with their growth. The limit allows for files that are open briefly."""
     limits = {"memory": most_memory, "open files": 8, "threads": 0}
     growths = {name: growth_of([each[name] for each in samples]) for name in samples[0]}
     return {name: growth for name, growth in growths.items() if growth > limits[name]}
@@ -283,13 +283,15 @@ def parse(arguments):
     parser = argparse.ArgumentParser(description=__doc__, formatter_class=argparse.RawDescriptionHelpFormatter)
     parser.add_argument("server", help="the build tree, whose cimhost serve is started; or the URL of a running server "
                         "that permits changes without authentication")
-    parser.add_argument("--pid", type=int, help="the process of a running server; without it, growth is not checked")
-    parser.add_argument("--leases", type=int, default=300, help="of a server that is started; default: %(default)s")
-    parser.add_argument("--seconds", type=float, default=3600, help="default: %(default)s")
-    parser.add_argument("--clients", type=int, default=16, help="default: %(default)s")
+    parser.add_argument("--pid", type=int, help="the process ID of a running server; without it, growth is not checked")
+    parser.add_argument("--leases", type=int, default=300, help="number of leases if the server is started; "
+                        "default: %(default)s")
+    parser.add_argument("--seconds", type=float, default=3600, help="duration of the test; default: %(default)s")
+    parser.add_argument("--clients", type=int, default=16, help="number of clients; default: %(default)s")
     parser.add_argument("--rate", type=float, default=200, help="requests per second of all clients together; default: "
                         "%(default)s")
-    parser.add_argument("--samples", type=int, default=40, help="of the server's resources; default: %(default)s")
+    parser.add_argument("--samples", type=int, default=40, help="number of samples of the server's resources; "
+                        "default: %(default)s")
     parser.add_argument("--growth", metavar="KB", type=int, default=1024, help="permitted growth of the server's "
                         "memory; default: %(default)s")
     return parser.parse_args(arguments)

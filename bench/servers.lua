@@ -1,5 +1,5 @@
--- Sends one CIM operation again and again, for wrk. The environment has its name and the file of its body, in which
--- each @ becomes another number.
+-- A wrk script that sends one CIM operation repeatedly. CIM_METHOD is the operation, CIM_BODY the file of the request's
+-- body. Each @ in the body is replaced by the number of the request.
 local file = assert(io.open(os.getenv("CIM_BODY"), "rb"))
 local body = file:read("*a")
 file:close()

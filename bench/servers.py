@@ -1,12 +1,12 @@
 #!/usr/bin/env python3
 """Measures CIM servers with wrk, side by side, and prints a Markdown table.
 
-Each cell has the median time of a request in milliseconds and the requests per second, of the best of several rounds:
-in each round, all servers are measured one after the other, so that other load of the machine affects all. Each begins
-once the processors are idle, since a server may still work on requests whose client has ended. The servers must serve
-the same leases in root/cimv2, without authentication. The leases that CreateInstance makes are deleted.
+Each cell has the median time of a request in milliseconds and the requests per second, of the best of several rounds.
+Each round measures all servers one after the other, so that other load of the machine affects all. Each measurement
+waits until the processors are idle, since a server may still work on requests of a client that has ended. The servers
+must serve the same leases in root/cimv2, without authentication. The leases that CreateInstance makes are deleted.
 
-With --baseline, the program http_baseline sends the responses of the first server from memory.
+With --baseline, also measures the program http_baseline, which sends the responses of the first server from memory.
 """
 
 import argparse
@@ -69,7 +69,7 @@ class Server:
             "CIMObject": "root%2Fcimv2"})
         response = self.connection.getresponse()
         content = response.read()
-        self.connection.close()  # SFCB ends connections that wait
+        self.connection.close()  # SFCB closes idle connections
         if response.status != 200 or b"<ERROR" in content:
             sys.exit(f"{self.name}: {operation}: {response.status} {content[:500]!r}")
         return content
@@ -78,7 +78,8 @@ class Server:
         return re.findall(r"<KEYVALUE[^>]*>([^<]*)<", self.ask("EnumerateInstanceNames", CLASS).decode())
 
     def delete_created(self):
-        """Deletes the created leases, also those of requests whose client has ended. Returns their number."""
+        """Deletes the leases of all CreateInstance requests, including those that the server finishes after the client
+        has ended. Returns their number."""
         deleted = 0
         while created := [each for each in self.leases() if each.startswith(CREATED)]:
             for each in created:
@@ -99,7 +100,7 @@ class Server:
 
 
 class Baseline(Server):
-    """Sends a response from memory."""
+    """Runs http_baseline, which sends a response from memory."""
 
     def __init__(self, program, content):
         with tempfile.NamedTemporaryFile(suffix=".xml") as file:
@@ -156,8 +157,8 @@ def main():
     parser.add_argument("servers", metavar="NAME=URL", nargs="+")
     parser.add_argument("--baseline", metavar="PROGRAM", type=pathlib.Path, help="the program http_baseline")
     parser.add_argument("--connections", metavar="N", type=int, nargs="+", default=[1, 8, 64])
-    parser.add_argument("--seconds", type=int, default=5, help="of each measurement; default: %(default)s")
-    parser.add_argument("--rounds", type=int, default=3, help="default: %(default)s")
+    parser.add_argument("--seconds", type=int, default=5, help="duration of each measurement; default: %(default)s")
+    parser.add_argument("--rounds", type=int, default=3, help="number of rounds; default: %(default)s")
     options = parser.parse_args()
     servers = [Server(*each.split("=", 1)) for each in options.servers]
     names = [*(each.name for each in servers), *(["from memory"] if options.baseline else [])]

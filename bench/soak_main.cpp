@@ -1,5 +1,5 @@
 // Sends many requests to the provider, and fails if the process's resources grow. Set the environment variable
-// GLIBC_TUNABLES=glibc.malloc.tcache_count=0 for exact figures: the C library counts its caches as in use.
+// GLIBC_TUNABLES=glibc.malloc.tcache_count=0 for exact figures; otherwise, they include the C library's caches.
 
 #include <CLI/CLI.hpp>
 #include <cstdio>
@@ -12,7 +12,7 @@
 
 namespace {
 
-/** The memory that a deleted record may keep, with its strings. */
+/** The memory that a deleted record and its strings may keep. */
 constexpr std::size_t bytesOfDeletion = 512;
 
 /** Heap and resident memory vary with the lengths of the current strings. */
@@ -36,7 +36,7 @@ public:
         std::fflush(stdout);
     }
 
-    /** Compares the first tenth with the last. @return whether no resource grew by more than allowed */
+    /** Compares the first sample with the last. @return whether no resource grew by more than allowed */
     bool hasNotGrown(std::size_t allowedBytes) const {
         const bench::ProcessResources& first = samples.front().resources;
         const bench::ProcessResources& last = samples.back().resources;
@@ -89,7 +89,7 @@ int main(int argc, char** argv) {
     arguments.add_option("--cycles", cycles, "Number of times to load, use and unload the library")
         ->check(CLI::Range(10, 1000000))
         ->capture_default_str();
-    arguments.add_option("--requests", requests, "Number of requests after that")
+    arguments.add_option("--requests", requests, "Number of requests after the cycles")
         ->check(CLI::Range(10, 1000000000))
         ->capture_default_str();
     arguments.add_flag("--gate", gated, "Send the requests through the gate");

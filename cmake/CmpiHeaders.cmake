@@ -1,4 +1,4 @@
-# Selects the CMPI headers: those of an installed CMPI development package, otherwise the project's own.
+# Selects the CMPI headers. By default: those of an installed CMPI development package, otherwise the project's own.
 set(LAW_CMPI_HEADERS AUTO CACHE STRING "Which CMPI headers to use: AUTO, SYSTEM or BUNDLED")
 set_property(CACHE LAW_CMPI_HEADERS PROPERTY STRINGS AUTO SYSTEM BUNDLED)
 

@@ -15,7 +15,7 @@ foreach(flag IN ITEMS -fstack-clash-protection -fcf-protection)
 endforeach()
 add_link_options(-Wl,-z,relro,-z,now,-z,noexecstack)
 
-# Fortified functions need an optimised build, and the sanitizers check more.
+# Fortified functions need an optimised build. Builds with sanitizers do not need them, because these check more.
 if(NOT LAW_SANITIZE)
     add_compile_options("$<$<NOT:$<CONFIG:Debug>>:SHELL:-U_FORTIFY_SOURCE -D_FORTIFY_SOURCE=2>")
 endif()

@@ -19,8 +19,8 @@ if(NOT CMAKE_INSTALL_FULL_LIBDIR IN_LIST CMAKE_CXX_IMPLICIT_LINK_DIRECTORIES)
 endif()
 
 # law_run_path(<target> [<directory>...])
-# A library in the build tree has the run path of the installed one: CMake would pad another one with empty elements, and
-# these mean the current directory.
+# Gives a library the run path of its installation in the build tree, too. CMake would pad a longer run path of the build
+# tree with empty elements, which mean the current directory.
 function(law_run_path target)
     set_target_properties(${target} PROPERTIES INSTALL_RPATH "${ARGN}")
     if(ARGN)
@@ -29,7 +29,7 @@ function(law_run_path target)
 endfunction()
 
 # law_install_provider(<target> COMPONENT <component> [BESIDE_OTHERS])
-# Installs a library that object managers load. BESIDE_OTHERS: it needs another library in that directory.
+# Installs a library that object managers load. BESIDE_OTHERS: the library needs another library in its directory.
 function(law_install_provider target)
     cmake_parse_arguments(arg "BESIDE_OTHERS" "COMPONENT" "" ${ARGN})
     set(directories ${from_provider_directory})
@@ -53,7 +53,7 @@ function(law_install_library target)
 endfunction()
 
 # law_install_configuration(<file> <directory> <name> <component>)
-# A file in a directory of the system's configuration, where the administrator's version is kept.
+# Installs a file below the directory of the system's configuration. Does not replace a different installed file.
 function(law_install_configuration file directory name component)
     install(CODE "
         set(new \"${file}\")

@@ -1,5 +1,5 @@
-# Installs the configuration file "new" as "name" into "directory", absolute or relative to the prefix. If another version
-# is installed, it may have the administrator's changes: it is kept, and the new one is installed as NAME.new.
+# Installs the configuration file "new" as "name" into "directory", which is absolute or relative to the prefix. Keeps a
+# different installed file, which may have the administrator's changes, and installs the new file as NAME.new.
 cmake_path(ABSOLUTE_PATH directory BASE_DIRECTORY "${CMAKE_INSTALL_PREFIX}")
 set(kept "$ENV{DESTDIR}${directory}/${name}")
 if(EXISTS "${kept}")

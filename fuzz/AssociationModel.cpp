@@ -20,7 +20,7 @@ constexpr const char* computerRole = "Antecedent";
 constexpr const char* elementRole = "Dependent";
 constexpr const char* placeOfComputer = "/system/computer";
 constexpr std::size_t oneComputer = 0;
-constexpr std::size_t twoComputers = 2;  // one of them without a name; enumerations of computers fail from here on
+constexpr std::size_t twoComputers = 2;  // one has no name; with this kind and the next, requests may fail
 
 struct Association {
     const char* name;
@@ -119,7 +119,7 @@ void requireValues(const Call& call, const cimhost::Instance& instance, const Sn
     }
 }
 
-/** Whether a request begins at an instance that may have associations, so that it succeeds. */
+/** Whether a request begins at an instance that may have associations, so that the request must succeed. */
 bool isTraversal(const Call& call) {
     return std::any_of(std::begin(associationClasses), std::end(associationClasses), [&](const Association& each) {
         const AssociationPair pair(each, "root/cimv2");
@@ -133,7 +133,7 @@ bool isEnumeration(const Call& call) {
                        [&](const Association& each) { return cim::sameName(call.request.path.className, each.name); });
 }
 
-/** One of the names that a filter may have; usually none. */
+/** A name for a filter; none in half of the cases. */
 std::optional<std::string> nextFilter(Bytes& bytes) {
     constexpr std::array names{computerRole,        elementRole,      "VELKO_LeaseSetting",   "VELKO_WarrantySetting",
                                "VELKO_Lease",       "VELKO_Warranty", "VELKO_ComputerSystem", "dependent",

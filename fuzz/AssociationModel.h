@@ -8,7 +8,7 @@
 
 namespace fuzz {
 
-/** A request for what is associated with the computer, its lease or its warranty, with any filter. */
+/** A request for the associations of the computer, its lease or its warranty, with any filter. */
 Call nextTraversal(Bytes& bytes);
 
 /**

@@ -5,7 +5,7 @@
 
 namespace fuzz {
 
-/** Derives decisions from the bytes of an input; from zeros after its end. */
+/** Derives decisions from the bytes of an input. After its end, each byte is 0. */
 class Bytes {
 public:
     Bytes(const std::uint8_t* data, std::size_t size) : next(data), end(data + size) {}

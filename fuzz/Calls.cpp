@@ -188,7 +188,7 @@ Value nextValue(Bytes& bytes) {
     }
 }
 
-/** Usually a string. */
+/** A value for a key, usually a string. */
 Value nextKeyValue(Bytes& bytes) {
     return bytes.below(8) == 0 ? nextValue(bytes) : testsupport::text(nextString(bytes));
 }
@@ -230,7 +230,7 @@ Value validValue(Bytes& bytes, CMPIType type) {
     }
 }
 
-/** Some of the properties of a class that can be modified. */
+/** Some of the modifiable properties of a class. */
 std::vector<const Writable*> someWritables(Bytes& bytes, const std::string& className) {
     const std::size_t low = bytes.byte();
     const std::size_t chosen = low | std::size_t{bytes.byte()} << 8U;

@@ -8,11 +8,11 @@
 #include "model/Request.h"
 #include "model/Value.h"
 
-// Calls of a provider, described by an input.
+// Calls to a provider, derived from an input.
 
 namespace fuzz {
 
-/** Something other than a request that happens to a provider. */
+/** A call or an event of a provider that is not a request. */
 enum class Event {
     cleanup,  ///< of the instance interface
     associationCleanup,
@@ -24,7 +24,7 @@ struct Call {
     std::optional<Event> event{};  ///< none: the request
     cimhost::Request request{};
     bool hasInstance = false;  ///< false: the instance of a creation or modification is a null pointer
-    bool isValid = false;      ///< whether the class can be changed, the path has all keys, and the values match types
+    bool isValid = false;      ///< whether the class can be changed, all keys are present, and all types are right
 
     bool performs(cimhost::Operation operation) const { return !event && request.operation == operation; }
     bool isRead() const { return !event && request.operation <= cimhost::Operation::getInstance; }
@@ -34,13 +34,13 @@ struct Call {
     }
 };
 
-/** Describes a call for people. */
+/** Returns a readable description of a call. */
 std::string describe(const Call& call);
 
 /** The next call that the input describes. */
 Call nextCall(Bytes& bytes);
 
-/** A string: usually one with a meaning in some place, otherwise any bytes except 0. */
+/** A string: in half of the cases one that has a meaning for a provider, otherwise up to 15 bytes other than 0. */
 std::string nextString(Bytes& bytes);
 
 }  // namespace fuzz

@@ -9,15 +9,15 @@
 #include "schema/MofWriter.h"
 #include "schema/ObjectPathText.h"
 
-// A request body in CIM-XML: it is refused, or the response is well-formed XML and agrees with a model of the
-// instances, which read the same once written.
+// A request body in CIM-XML: it is refused, or the response is well-formed XML. The instances that it creates or
+// modifies are the same after they are written and read.
 
 namespace {
 
 using namespace cimhost;
 using fuzz::requireSame;
 
-/** Instances by the string of their path. */
+/** Stores instances by the string of their path. */
 class Model : public UpCalls {
 public:
     Response perform(Request request) override {

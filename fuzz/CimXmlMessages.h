@@ -23,16 +23,16 @@ std::optional<std::string> charactersOf(const cimhost::Value& value);
 /** Ways of writing the same request. */
 struct Spelling {
     bool hasCharacterReferences = false;  ///< for all ASCII characters of values
-    bool hasCdata = false;                ///< sections with values
+    bool hasCdata = false;                ///< sections for values
     bool hasComments = false;             ///< and blanks between elements
-    bool hasOtherCase = false;            ///< names of operations, parameters and keys in lower case
-    bool hasTypes = false;                ///< of properties and keys, in the request, too
-    bool namesSingleKey = false;          ///< if the path has one key
+    bool hasOtherCase = false;            ///< names of operations, parameters and keys are in lower case
+    bool hasTypes = false;                ///< attributes of properties and keys
+    bool namesSingleKey = false;          ///< in a KEYBINDING, if the path has one key
 };
 
 Spelling nextSpelling(Bytes& bytes);
 
-/** A request, with what is known about its response. */
+/** A request message. */
 struct XmlRequest {
     std::string operation{};  ///< as in the message
     std::string document{};
@@ -41,7 +41,7 @@ struct XmlRequest {
 /** The request for a call. */
 XmlRequest requestFor(const Call& call, const Spelling& spelling);
 
-/** @name Pull operations: a call that returns several objects, in parts */
+/** @name Pull operations, which return the results of a call in parts */
 ///@{
 XmlRequest openingRequest(const Call& call, const Spelling& spelling, std::size_t most);
 XmlRequest pullRequest(bool ofPaths, const std::string& nameSpace, const std::string& context, std::size_t most);
@@ -56,10 +56,10 @@ struct XmlResponse {
     std::map<std::string, std::string> parameters{};
 };
 
-/** Reads the response to an operation. @throws Violation if it is not one */
+/** Reads the response to an operation. @throws Violation if the message is not such a response */
 XmlResponse responseIn(const cimhost::cimxml::XmlElement& root, const std::string& operation);
 
-/** Reads the results of a call as events. @throws Violation if an element is not one of the call's */
+/** Reads the results of a call as events. @throws Violation if the call cannot return an element */
 cimhost::ResultEvents eventsIn(const std::vector<cimhost::cimxml::XmlElement>& results, const Call& call,
                                bool isPulled);
 

@@ -177,7 +177,7 @@ private:
     const Spelling& spelling;
 };
 
-/** The parameters of a call that both its operation and the one that opens an enumeration have. */
+/** The parameters that the operation of a call and the corresponding Open operation have in common. */
 std::string parametersOf(const Call& call, const Writer& writer, const char* pathParameter) {
     const cimhost::Request& request = call.request;
     const cimhost::AssociationFilter& filter = request.filter;

@@ -13,9 +13,9 @@
 #include "support/AssetModel.h"
 #include "support/Values.h"
 
-// Sequences of CIM-XML requests to the server, with the gate as its provider: the responses and the stored data are
-// those of the gate's model, also when a request is written in another way and when results are pulled in parts. A
-// request with random changes has a well-formed response, and changes data only if it reports success.
+// Sequences of CIM-XML requests to the server, with the gate as its provider: the responses and the stored data match
+// the gate's model, for all ways of writing a request and if results are pulled in parts. A request with random changes
+// has a well-formed response, and changes data only if the response reports success.
 
 namespace {
 
@@ -29,7 +29,7 @@ constexpr const char* servedNameSpace = "root/cimv2";
 constexpr int refused = -1;  // instead of a CIM status
 constexpr int invalidEnumerationContext = 21;
 
-/** Sends the requests of the server to the gate. */
+/** Forwards the server's requests to the gate. */
 class GateManager : public cimhost::UpCalls {
 public:
     explicit GateManager(SystemUnderTest& itsGate) : gate(itsGate) {}
@@ -144,7 +144,7 @@ bool isKnownClass(const std::optional<std::string>& name) {
     return !name || CimXmlServer::classes().findClass(*name) != nullptr;
 }
 
-/** The status of a request that the server does not send to a provider; none for others. */
+/** The status of a request that the server does not send to a provider; none for other requests. */
 std::optional<int> statusOfServer(const Call& call) {
     const cimhost::Request& request = call.request;
     const bool isChange = call.performs(Operation::createInstance) || call.performs(Operation::modifyInstance);
@@ -165,7 +165,8 @@ std::optional<int> statusOfServer(const Call& call) {
                                                                   : std::nullopt;
 }
 
-/** Whether the server may refuse a request that the gate would accept: the path or the filter is not one of the schema.
+/** Whether the server may refuse a request that the gate would accept: the path or the filter does not match the
+ * schema.
  */
 bool mayBeRefused(const Call& call) {
     const cimhost::Request& request = call.request;
@@ -304,7 +305,7 @@ private:
         }
     }
 
-    /** Sometimes sends a pull of the other kind, or closes the enumeration, which ends it. */
+    /** Sometimes sends a pull of the other kind, or closes the enumeration. @return whether it is now closed */
     bool isClosed(bool ofPaths, const std::string& nameSpace, const std::string& context) {
         const std::size_t choice = bytes.below(8);
         if (choice == 1) {
@@ -318,7 +319,7 @@ private:
         return choice == 2;
     }
 
-    /** Sends a request with random changes. If it reports success, its effect is not known. */
+    /** Sends a request with random changes. Its effect is unknown if the response reports success. */
     void sendChanged(const std::string& document) {
         const Snapshot before;
         const auto root = server.respond(changedAtRandom(document, bytes));

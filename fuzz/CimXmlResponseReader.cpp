@@ -67,7 +67,7 @@ std::string nameSpaceIn(const XmlElement& localNameSpacePath) {
     return nameSpace;
 }
 
-/** INSTANCEPATH, with the server's host. */
+/** Reads INSTANCEPATH, which must have the server's host. */
 ObjectPath fullPathIn(const XmlElement& instancePath) {
     const auto [place, name] = twoChildren(instancePath, "NAMESPACEPATH", "INSTANCENAME");
     const auto [host, nameSpace] = twoChildren(place, "HOST", "LOCALNAMESPACEPATH");
@@ -110,7 +110,7 @@ NamedValue propertyIn(const XmlElement& property) {
     return {name, isModelled ? typedValue(value, type) : testsupport::text(value.characters)};
 }
 
-/** INSTANCE. Adds the keys of its path if the call's list of properties omits them. */
+/** Reads INSTANCE. Adds the keys of its path if the call's list of properties omits them. */
 cimhost::Instance instanceIn(const XmlElement& element, ObjectPath path, const Call& call) {
     requireSame(requiredAttribute(element, "CLASSNAME"), path.className, "class of an instance");
     cimhost::Instance instance{std::move(path), {}};

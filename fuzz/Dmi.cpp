@@ -12,7 +12,7 @@
 #include "cim/Utf8.h"
 #include "framework/NodeTree.h"
 
-// Strings of the firmware: any of them results in nodes with readable names. Readable names are not changed.
+// Strings of the firmware: any string results in nodes with readable names. Readable names are not changed.
 
 namespace {
 
@@ -71,7 +71,7 @@ void requireReadable(std::string_view value, const std::string& what) {
     }
 }
 
-/** The model and the suffix of a product name, which the first dash separates. */
+/** Splits a product name at its first dash into model and suffix. */
 std::pair<std::string, std::string> partsOf(const std::string& product) {
     const std::size_t dash = product.find('-');
     require(dash != std::string::npos && dash > 0, "a product name has a dash");
@@ -83,7 +83,7 @@ std::pair<std::string, std::string> partsOf(const std::string& product) {
     return {model, suffix};
 }
 
-/** Removes the front of an input up to the first null character, and returns it. */
+/** Removes the part of an input up to its first null character, and returns the part without that character. */
 std::string_view takePart(std::string_view& input) {
     const std::size_t end = std::min(input.find('\0'), input.size());
     const std::string_view part = input.substr(0, end);

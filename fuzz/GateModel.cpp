@@ -22,7 +22,7 @@ using testsupport::RecordModel;
 
 constexpr const char* identifierName = "InstanceID";
 
-/** The value that a client sends for a field; none if it does not. */
+/** The value that a client sends for a field; none if the client sends no value. */
 std::optional<std::string> given(const Call& call, const testsupport::ModelField& field) {
     switch (field.form) {
         case Form::number:
@@ -50,7 +50,7 @@ AssetValues assetValues() {
     return values;
 }
 
-/** Removes the characters from both ends that an object manager may remove: blanks, and possibly non-ASCII bytes. */
+/** Removes from both ends characters that an object manager may remove: control characters, blanks, non-ASCII bytes. */
 std::string trimmed(const std::string& value, bool alsoOutsideAscii) {
     const auto stays = [&](unsigned char each) { return each > ' ' && !(alsoOutsideAscii && each > 0x7F); };
     const auto begin = std::find_if(value.begin(), value.end(), stays);
@@ -58,13 +58,13 @@ std::string trimmed(const std::string& value, bool alsoOutsideAscii) {
     return {begin, end};
 }
 
-/** Whether a sent value is the stored one, as the client received it, and therefore not a change. */
+/** Whether a sent value equals the stored value as the client received it, and is therefore not a change. */
 bool isSentBack(const Call& call, const std::string& value, const std::string& stored) {
     return !stored.empty() && (trimmed(stored, false) == value ||
                                (!call.request.properties.has_value() && trimmed(stored, true) == value));
 }
 
-/** The records of a store. There are two representations of no date, which clients cannot distinguish. */
+/** The records of a store. Replaces one of the two representations of no date, which clients cannot distinguish. */
 Records recordsOf(const Store& store) {
     Records records = store.records();
     for (ModelRecord& record : records) {
@@ -76,7 +76,7 @@ Records recordsOf(const Store& store) {
     return records;
 }
 
-/** Whether the values of a valid call can be stored: records lose strings of one character, asset data intervals. */
+/** Whether a valid call's values can be stored: records lose strings of one character, asset data lose intervals. */
 bool canBeStored(const Call& call, bool isRecord) {
     const auto& values = call.request.instance.properties;
     return std::all_of(values.begin(), values.end(), [&](const cimhost::NamedValue& each) {
@@ -138,7 +138,7 @@ void requireCreated(const Store& store, const Call& call, const cimhost::Provide
             "the identifier is the path's");
     RecordModel model(store.fields());
     model.records = std::move(expected);
-    require(model.find(*identifier) == nullptr, "what is there already is not created");
+    require(model.find(*identifier) == nullptr, "an existing record is not created again");
     ModelRecord record = model.newRecord(*identifier);
     applyGiven(model, call, record, false);
     model.records.push_back(std::move(record));

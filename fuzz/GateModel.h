@@ -28,7 +28,7 @@ struct Snapshot {
     AssetValues asset;  ///< by key of the file; absent values are empty
 };
 
-/** Whether a call asks for a property: it has no list of properties, or the property is on it. */
+/** Whether a call asks for a property: it has no list of properties, or its list contains the property. */
 bool isListed(const Call& call, const std::string& property);
 
 /** The values of a record that a response must have: the identifier, and the listed properties. */
@@ -36,13 +36,13 @@ std::vector<std::string> shownRecord(const testsupport::RecordModel& model, cons
                                      const testsupport::ModelRecord& record);
 
 /**
- * Checks the response to a call and the data after it: a call that returns OK has the effect that CIM defines, any
- * other call has a message and changes nothing, and a valid call has its status.
+ * Checks the response to a call and the data after it: a call that returns OK has the effect that CIM defines. Any
+ * other call returns a message and changes nothing. A valid call returns the status that CIM defines.
  * @throws Violation
  */
 void requireRight(const Call& call, const cimhost::ProviderResponse& response, const Snapshot& before);
 
-/** A read that has no effect. Before it, the gate loads a provider again whose change was rolled back. */
+/** A read that has no effect. If a change was rolled back, the gate reloads the provider before this read. */
 Call harmlessRead();
 
 }  // namespace fuzz

@@ -1,8 +1,8 @@
 #include "AssociationModel.h"
 #include "Target.h"
 
-// Sequences of calls of the gate's function tables: a call that returns OK has the effect that CIM defines, and
-// survives a restart; any other call has a message and changes nothing.
+// Sequences of calls to the gate's function tables: a call that returns OK has the effect that CIM defines, which
+// survives a restart. Any other call returns a message and changes nothing.
 
 namespace {
 
@@ -10,7 +10,7 @@ using namespace fuzz;
 
 constexpr std::size_t mostCalls = 30;
 
-/** Performs a call of the gate, and compares it with the models. */
+/** Calls the gate, and compares its response and the stored data with the models. */
 void performAndCompare(SystemUnderTest& gate, const Call& call, std::size_t computers) {
     const Snapshot before;
     const cimhost::ProviderResponse response = gate.perform(call);

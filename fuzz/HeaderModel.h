@@ -7,8 +7,8 @@
 
 #include "server/HttpRequest.h"
 
-// A model of the rules for the headers of a CIM request: a table of values, each with the reason to refuse it. It does
-// not interpret values.
+// A model of the rules for the headers of a CIM request: a table of values, each with the reason to refuse it. The
+// model does not interpret values.
 
 namespace fuzz {
 
@@ -24,23 +24,23 @@ struct Refusal {
 
 /** A value of a header. */
 struct HeaderValue {
-    std::vector<std::string> sent{};  ///< none: the header is absent; two: it is there twice
+    std::vector<std::string> sent{};  ///< empty: the header is absent; two: it occurs twice
     Refusal refusal{};
-    std::string decoded{};  ///< of CIMMethod and CIMObject
+    std::string decoded{};  ///< only for CIMMethod and CIMObject
 };
 
 struct HeaderRow {
     std::string name{};
-    bool hasPrefix = false;  ///< in requests with an extension
+    bool hasPrefix = false;  ///< whether its name has a prefix in requests with an extension
     std::vector<HeaderValue> values{};
 };
 
-/** The rows of all headers that the rules mention. The first value of each is right. */
+/** The rows of all headers that the rules mention. The first value of each row is accepted. */
 const std::vector<HeaderRow>& headerRows();
 
 constexpr std::size_t largestBody = 1000;
 
-/** A request of one value per row. */
+/** A request with one value per row. */
 struct ModelRequest {
     std::string method = "POST";
     std::string prefix{};  ///< of the headers of the operation
@@ -54,10 +54,10 @@ struct ModelRequest {
 
     bool isExtended() const { return method == "M-POST"; }
 
-    /** Whether other software could see another end of the request, which is refused before all else. */
+    /** Whether other software could find a different end of the request. Such a request is refused first. */
     bool isAmbiguous() const;
 
-    /** The reasons to refuse the request, of which the response has one; none: it is accepted. */
+    /** The reasons to refuse the request; empty if it is accepted. The response has one of the reasons. */
     std::set<Refusal> refusals() const;
 };
 

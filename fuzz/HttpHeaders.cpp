@@ -10,10 +10,10 @@
 #include "server/Authentication.h"
 #include "server/HeaderCheck.h"
 
-// The head of an HTTP request. An input that begins with a byte outside of ASCII chooses values of the model's table,
-// and the response must be the model's; "pairs of Host" represents all pairs of a value of Host with one of another
-// header. Any other input is a head, with a line for the method and one per header: a refusal has a status, and an
-// accepted request has all necessary headers.
+// The head of an HTTP request. An input that begins with a byte outside of ASCII chooses values from the model's table,
+// and the response must match the model. The input "pairs of Host" represents all pairs of a value of Host and a value
+// of another header. Any other input is a head, with a line for the method and one per header: a refusal has a status,
+// and an accepted request has all necessary headers.
 
 namespace {
 
@@ -72,7 +72,7 @@ void requireComplete(const HttpRequest& request, const CimHeaders& accepted, boo
 void requireRefusal(const HttpResponse& response) {
     require(response.status == 200 || (response.status >= 400 && response.status < 600), "a response has a status");
     require((response.status == 405 || response.status == 200) == (response.headers.count("Allow") == 1),
-            "other methods are listed");
+            "a response with status 200 or 405 lists the methods");
     for (const auto& [name, value] : response.headers) {
         require(value.find_first_of("\r\n") == std::string::npos, "a client cannot add headers to the response");
     }
@@ -86,7 +86,7 @@ std::string described(const ModelRequest& model) {
     return head;
 }
 
-/** The reason of a refusal, which a request with an extension receives in a header with its prefix. */
+/** The reason for a refusal. In the response to a request with an extension, its header has the extension's prefix. */
 Refusal refusalIn(const HttpResponse& response, const std::string& prefix) {
     require(prefix.empty() || response.headers.count("CIMError") == 0, "all headers have the prefix");
     return {response.status, headerIn(response.headers, prefix + "CIMError").value_or("")};
@@ -110,7 +110,7 @@ void requireModelsResponse(const ModelRequest& model) {
             std::to_string(refusal.status) + " " + refusal.cimError + " has a reason\n" + described(model));
 }
 
-/** Chooses values, most of which are right. */
+/** Chooses values, at least half of which are accepted on average. */
 ModelRequest modelFrom(Bytes bytes) {
     ModelRequest model;
     const unsigned choice = bytes.byte();
@@ -124,7 +124,9 @@ ModelRequest modelFrom(Bytes bytes) {
     return model;
 }
 
-/** Checks all requests in which only a certain header and one other may not have the first of their values. */
+/**
+ * Checks every combination of values of one header and one other header. All remaining headers keep their first value.
+ */
 void requirePairs(ModelRequest model, std::size_t one) {
     const auto& rows = headerRows();
     for (std::size_t& chosen = model.values[one]; chosen < rows[one].values.size(); ++chosen) {

@@ -1,8 +1,8 @@
 #include "SystemUnderTest.h"
 #include "gate/session/ProviderConnection.h"
 
-// The gate as the system under test. Its provider is linked into the fuzzer, too: loading it only destroys and reads
-// its tables.
+// The gate as the system under test. The provider is linked into the fuzzer, too: loading it only destroys its tables
+// and reads them again.
 
 extern "C" {
 CMPIInstanceMI* LeaseAndWarrantyGate_Create_InstanceMI(const CMPIBroker*, const CMPIContext*, CMPIStatus*);

@@ -5,7 +5,7 @@
 
 namespace fuzz {
 
-/** A file in memory. It has a path, with which it can be opened, read and rewritten. */
+/** A file in memory with a path, so that it can be opened, read and rewritten like any file. */
 class MemoryFile {
 public:
     /** @throws std::system_error if the system cannot create it */

@@ -10,8 +10,8 @@
 #include "schema/MofReader.h"
 #include "schema/MofWriter.h"
 
-// MOF: an input is rejected with a LoadError, or its classes are consistent and its values are read as they are
-// written.
+// MOF: an error is a LoadError. The classes that are read are consistent, and their values and the instances are the
+// same after they are written and read.
 
 namespace {
 
@@ -54,7 +54,7 @@ void requireSound(const Schema& schema, const Class& each) {
 
 bool isSettled(const Schema& schema, const cimhost::ObjectPath& path, const std::string& referenceClass);
 
-/** Whether references in a value are read in the same way again: their classes may have been declared after them. */
+/** Whether references in a value are read in the same way again. They can differ if a class was declared after them. */
 bool isSettled(const Schema& schema, const Value& value, const std::string& referenceClass) {
     return std::all_of(value.elements().begin(), value.elements().end(), [&](const cimhost::Scalar& element) {
         const auto* path = std::get_if<std::shared_ptr<const cimhost::ObjectPath>>(&element);
@@ -90,7 +90,7 @@ std::string newClassName(const Schema& schema) {
     return name;
 }
 
-/** Requires that the defaults of a class are read as they are written. */
+/** Requires that the defaults of a class are the same after they are written and read. */
 void requireSameDefaults(Schema& schema, const Class& each) {
     std::string declarations;
     for (const Property& property : each.properties) {
@@ -114,7 +114,7 @@ bool isSettled(const Schema& schema, const cimhost::Instance& instance) {
     });
 }
 
-/** Requires that the instances are read as they are written. */
+/** Requires that the instances are the same after they are written and read. */
 void requireSameInstances(Schema& schema) {
     const std::vector<cimhost::Instance> instances = schema.instances();
     for (const cimhost::Instance& instance : instances) {

@@ -6,7 +6,7 @@
 #include "schema/MofReader.h"
 #include "schema/ObjectPathText.h"
 
-// Object paths: an input is rejected with a PathError, or its path is read as it is written.
+// Object paths: an input is rejected with a PathError, or its path is the same after it is written and read.
 
 namespace {
 

@@ -92,7 +92,7 @@ void checkSetting(const Input& input, const std::string& key, const std::string&
 /** Requires that a string converts to a date and back unchanged, or to no date. */
 void checkDate(const std::string& string) {
     const std::string date = KO::Utils::convertCIMDateTime(KO::Utils::convertStringToDateTime(string));
-    require(date == string || date == cim::noDate, "a date is the one it was made from");
+    require(date == string || date == cim::noDate, "a date converts back to its string");
 }
 
 }  // namespace

@@ -25,7 +25,7 @@ const Value* valueNamed(const std::vector<NamedValue>& values, const char* name)
     return found == values.end() ? nullptr : &found->value;
 }
 
-/** The element of a value that is neither null nor an array; null for others. */
+/** The element of a value that is neither null nor an array; a null pointer for other values. */
 const cimhost::Scalar* scalarOf(const std::vector<NamedValue>& values, const char* name) {
     const Value* value = valueNamed(values, name);
     return value == nullptr || value->isNull || value->isArray ? nullptr : &value->single;
@@ -193,7 +193,7 @@ void ExpectedRecords::requireAgreement() const {
 }
 
 void ExpectedAsset::modify(const Instance& instance) {
-    std::string before;  // the preceding personalized value, which the provider repeats if the next is not given
+    std::string before;  // the preceding personalized value, which the provider copies if the next one is not sent
     for (const testsupport::AssetField& field : testsupport::assetFields) {
         const auto given = givenString(instance, field.property);
         if (field.kind == AssetKind::personalized) {

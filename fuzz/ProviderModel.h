@@ -15,7 +15,7 @@ namespace fuzz {
 std::optional<std::string> keyString(const cimhost::ObjectPath& path, const char* name);
 
 /** @name Values of properties as the provider reads them; none if it ignores them
- * It reads strings from strings and datetimes, numbers from integers in the range of uint32.
+ * The provider reads strings from strings and datetimes, and numbers from integers in the range of uint32.
  */
 ///@{
 std::optional<std::string> givenString(const cimhost::Instance& instance, const char* name);
@@ -40,7 +40,7 @@ public:
     Expectation apply(const Call& call);
     void restart();
 
-    /** @throws Violation if memory or file differ */
+    /** @throws Violation if the records in memory or in the file are not the expected ones */
     void requireAgreement() const;
 
     std::size_t size() const { return model.records.size(); }

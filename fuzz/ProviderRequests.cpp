@@ -12,9 +12,9 @@
 #include "support/AssetModel.h"
 #include "support/Values.h"
 
-// Sequences of calls of the provider's function tables: responses, tables and files are those of a model of the
-// provider. Associations and the agent's identity change nothing. With and without tracing, in which the provider finds
-// records in different ways, all responses are the same.
+// Sequences of calls to the provider's function tables: responses, tables and files match a model of the provider.
+// Requests for associations and the agent's identity change nothing. All responses are the same with and without
+// tracing, although tracing makes the provider find records in a different way.
 
 fuzz::Interfaces fuzz::openInterfaces(const CMPIBroker* broker) {
     CMPIStatus status{CMPI_RC_OK, nullptr};
@@ -38,7 +38,7 @@ bool isSetting(const std::string& className) {
     return isOneOf(className, {"VELKO_LeaseSetting", "VELKO_WarrantySetting"});
 }
 
-/** The response of a call that does not depend on records and asset data. */
+/** The response to a call that does not depend on records and asset data. */
 Expectation other(int rc) {
     return {rc, 0, rc != CMPI_RC_OK, {}};
 }
@@ -71,7 +71,7 @@ std::string described(const cimhost::ProviderResponse& response) {
     return description;
 }
 
-/** A sequence of calls of the provider and the model. */
+/** Performs a sequence of calls with the provider and the model. */
 class TestCase {
 public:
     explicit TestCase(Bytes& bytes) : provider(bytes.byte()) {}

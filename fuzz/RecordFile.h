@@ -15,8 +15,8 @@
 
 namespace fuzz {
 
-/** Larger counts of records are skipped: reading them takes long. If they do not fit into memory, they must be
- * rejected.
+/** Files with a larger count of records are skipped, because reading them takes long. If the records do not fit into
+ * memory, the file must be rejected.
  */
 constexpr std::size_t mostRecords = 400;
 
@@ -44,7 +44,7 @@ class RecordFile {
 public:
     RecordFile(MemoryFile& itsFile, const testsupport::ModelFields& fields) : file(itsFile), model(fields) {}
 
-    /** Reads the file with both. @throws Violation if their records differ */
+    /** Reads the file with the store and the model. @throws Violation if their records differ */
     void load() {
         count = 0;
         table.clear();
@@ -64,7 +64,7 @@ public:
         }
     }
 
-    /** Writes the file with both. @return its content  @throws Violation if their content differs */
+    /** Writes the file with the store. @return its content  @throws Violation if the model's content differs */
     std::string rewrite() {
         require(KO::LeaseWarrantyProvider::writeRecords(file.path(), count, table), "the file can be written");
         const std::string content = file.content();
@@ -101,7 +101,7 @@ void requireNothingIsRead(const MemoryFile& file) {
     require(isRefused && count == 0 && table.empty(), "more records than fit into memory are rejected");
 }
 
-/** Checks that any content is read as by the model, and that a file that was written is stable. */
+/** Checks that the store reads any content as the model does, and that rewriting a written file does not change it. */
 template <class Store>
 int checkRecordFile(const testsupport::ModelFields& fields, std::string_view input) {
     static MemoryFile file;

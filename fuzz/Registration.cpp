@@ -9,7 +9,8 @@
 #include "cim/Names.h"
 #include "schema/Errors.h"
 
-// Registration files: an input is rejected with a LoadError, or its registrations are read as they are written.
+// Registration files: an input is rejected with a LoadError, or its registrations are the same after they are written
+// and read.
 
 namespace {
 
@@ -67,7 +68,7 @@ int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     }
     std::for_each(registrations.begin(), registrations.end(), requireComplete);
     const auto brackets = static_cast<std::size_t>(std::count(file.begin(), file.end(), '['));
-    require(registrations.size() <= brackets, "each registration has its head");
+    require(registrations.size() <= brackets, "each registration has a section head");
     const std::string first = written(registrations);
     requireSame(written(read(first)), first, "registrations that were written and read");
     return 0;

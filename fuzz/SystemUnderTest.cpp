@@ -86,14 +86,14 @@ cimhost::ClassInfoLookup schemaClasses() {
     return known;
 }
 
-/** The broker. It is not destroyed, because the system under test may keep it. */
+/** The broker. It is never destroyed, because the system under test may keep a pointer to it. */
 struct Manager {
     static Manager& only() {
         static Manager& manager = *new Manager;
         return manager;
     }
 
-    /** Ends the provider, and opens it again without data files. */
+    /** Terminates the provider, and opens it again without data files. */
     void restartWithoutFiles() {
         {
             cimhost::RequestScope scope(broker);

@@ -42,8 +42,8 @@ const Store& warrantyStore();
 const Store* storeOf(const std::string& className);
 
 /**
- * The provider or the gate, with a broker. It is linked into the fuzzer, since the fuzzing engine does not support
- * unloading; a restart only destroys and reads its tables.
+ * The provider or the gate, with a broker. Both are linked into the fuzzer, since the fuzzing engine does not support
+ * unloading. A restart only destroys the tables and reads them again.
  */
 class SystemUnderTest {
 public:
@@ -56,7 +56,7 @@ public:
      */
     explicit SystemUnderTest(std::size_t computers);
 
-    /** Calls a function of the tables. */
+    /** Performs a call with the function tables, or restarts. */
     cimhost::ProviderResponse perform(const Call& call);
 
     /** Destroys the record tables and reads them again. */

@@ -8,7 +8,7 @@
 
 /**
  * The function that each fuzzer defines. It runs the code with one input and checks its invariants.
- * @return 0, or -1 for an input that is not to be added to the corpus
+ * @return 0, or -1 for an input that must not be added to the corpus
  * @throws fuzz::Violation if an invariant does not hold
  */
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size);
@@ -28,7 +28,7 @@ inline void require(bool holds, const std::string& what) {
     }
 }
 
-/** @throws Violation if the values differ. The message contains strings and numbers. */
+/** @throws Violation if the values differ. The message contains the values if they are strings or numbers. */
 template <class Value>
 void requireSame(const Value& found, const Value& expected, const std::string& what) {
     if (found == expected) {

@@ -1,4 +1,4 @@
-# The Debian packages, one per component. Include this file last: it packs what all other files install.
+# The Debian packages, one per component. Include this file last: it packs the files that all other directories install.
 set(CPACK_GENERATOR DEB)
 set(CPACK_SET_DESTDIR ON)
 set(CPACK_INSTALL_PREFIX ${CMAKE_INSTALL_PREFIX})
@@ -62,7 +62,7 @@ macro(law_package component name)
     law_install_overrides(${component} ${name})
 endmacro()
 
-# Documents that are not in the provider's package.
+# The packages of documents that are not in the provider's package.
 set(package_of_agent.md ostrel-reference-agent)
 set(package_of_cimhost.md cimhost)
 set(package_of_serve.md cimhost)

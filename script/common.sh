@@ -31,7 +31,7 @@ refuse_arguments() {
     exit 2
 }
 
-# Prints the packages of some stages that are not installed, one per line.
+# missing_packages STAGE...: prints the packages of the stages that are not installed, one per line.
 missing_packages() {
     local stage package
     for stage in "$@"; do
@@ -51,7 +51,7 @@ as_root() {
     fi
 }
 
-# Installs the missing packages of some stages. Needs root only if there are any.
+# install_packages STAGE...: installs the missing packages of the stages. Needs root only if a package is missing.
 install_packages() {
     local packages
     command -v dpkg-query >/dev/null || fail "this system has no dpkg; script/packages lists what the build needs"
@@ -66,8 +66,8 @@ install_packages() {
     as_root env DEBIAN_FRONTEND=noninteractive apt-get install -y -qq --no-install-recommends "${packages[@]}"
 }
 
-# build PRESET [TARGET...]: configures a preset, with the options in `build_options`, and builds it, or only some of its
-# targets.
+# build PRESET [TARGET...]: configures a preset with the options in `build_options`, and builds the targets, by default
+# all.
 build_options=()
 build() {
     local preset=$1
@@ -84,7 +84,7 @@ source_files() {
 
 # Prints the paths of the project's shell scripts in the same form.
 shell_scripts() {
-    # git grep passes over links to folders, which awk cannot read.
+    # git grep skips links to folders, which awk cannot read.
     git grep -lzE '^#!.*sh$|shellcheck shell=' | xargs -0 awk '
         (FNR == 1 && /^#!.*sh$/) || (FNR == 2 && /shellcheck shell=/) { printf "%s%c", FILENAME, 0 }
         FNR == 2 { nextfile }'

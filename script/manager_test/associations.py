@@ -59,7 +59,8 @@ def check_association(run, cls):
     def link(computer, record):
         return Path.of(cls.name, **{source.name: computer, target.name: record})
 
-    # The bare provider enumerates every record with the first computer, and returns all but the last for its record.
+    # The bare provider enumerates every record with the first computer. For the computer's record, it returns all
+    # computers except the last.
     pairs = held if run.is_gate else {computer: records for computer in computers[:1]}
     run.check(f"ein {cls.name}: pairs", set(listed),
               {link(computer, record) for computer in pairs for record in pairs[computer]})

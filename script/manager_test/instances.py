@@ -8,7 +8,7 @@ from .wbemcli import Path, assigned
 RECORDS = ("VELKO_Lease", "VELKO_Warranty")
 NEVER_EMPTY = ("VELKO_OstrelAgent", "VELKO_AssetIDDetails", "VELKO_ComputerSystem")
 
-# They begin and end with ASCII letters: some object managers remove other characters at the ends.
+# Some object managers remove characters other than ASCII letters at the ends, so the test puts letters there.
 IDENTIFIERS = ["with blanks inside", "Jürgen & Söhne <\"it's\"> 日本 Ltd", "a,b=c;d:e/f.g\\h"]
 VALUES = {
     "string": ["ACME Leasing Co", "Jo's \"Müller & Söhne\", <日本 €>; 5 % = {a} \\ [b] #1", ""],
@@ -33,12 +33,12 @@ CONSTANT = {
     "VELKO_AssetIDDetails": {"Caption": "Asset ID Information", "Description": "Asset ID Information",
                              "AssetIDStringArea": "1024"},
 }
-# Properties that have the value of another.
+# Properties that have the value of another property.
 COPIES = {
     "VELKO_OstrelAgent": {"ProductName": "Name"},
     "VELKO_AssetIDDetails": {"DeploymentProfile": "ZOPMProfile", "DeploymentUpdateTime": "ZOPMUpdateTime"},
 }
-# Keys that the provider compares on every machine. The instrumentation may have no value for others.
+# Keys that the provider compares on every machine. The instrumentation may have no value for the other keys.
 COMPARED = {"VELKO_AssetIDDetails": ["IdentifyingNumber", "Version"]}
 
 
@@ -116,7 +116,7 @@ def check_get(run, cls, instance):
 
 
 def absent(path, key):
-    """Returns the path of a missing instance, with another value of the key; for a reference, of a key of it."""
+    """Returns the path of a missing instance: changes the key, or a key of the path that it refers to."""
     value = dict(path.keys)[key]
     return path.replaced(**{key: absent(value, value.keys[0][0]) if isinstance(value, Path) else "no such value"})
 
@@ -177,7 +177,7 @@ def check_values(run, cls, path, properties):
 
 
 def check_values_and_restore(run, cls, path):
-    """Tests the properties whose values can be restored, and restores them at the end."""
+    """Tests the properties whose values can be restored, and restores the values at the end."""
     original = run.find(path)
     if not run.check(f"{path} is found", original is not None):
         return
@@ -208,7 +208,8 @@ def without(values, names):
 
 
 def check_wrong_values(run, cls, path):
-    """Checks that a wrong value is refused or preserved, and that no other property changes."""
+    """Checks that a wrong value is refused or results in a valid one, and that no other property changes. A wrong
+    string is refused or stored unchanged."""
     for prop in cls.writable:
         for value in WRONG[prop.type] if run.is_gate or prop.type != "string" else []:
             before = steady(run.find(path))

@@ -119,6 +119,6 @@ class Run:
 
 
 def steady(instance):
-    """Returns the values except those that change with the time; none without an instance."""
+    """Returns an instance's values except those that change with time; an empty dictionary for None."""
     values = instance.values if instance else {}
     return {name: value for name, value in values.items() if name != "LocalDateTime"}

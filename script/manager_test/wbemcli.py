@@ -149,7 +149,7 @@ class Client:
         return response
 
     def failure_to_connect(self):
-        """Returns the message of a connection that fails, or nothing."""
+        """Returns the error message if the connection fails, or an empty string."""
         response = self.send("ein", "VELKO_OstrelAgent")
         return response.message if response.code < 0 else ""
 

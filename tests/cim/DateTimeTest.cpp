@@ -24,8 +24,8 @@ TEST(CimDateTime, RejectsOtherStringsAsPointsInTime) {
     for (const char* text : {
              "",
              "00000000000000.000000-000",
-             "20230229000000.000000+000",  // no leap year
-             "19000229000000.000000+000",  // no leap year at the end of a century
+             "20230229000000.000000+000",  // not a leap year
+             "19000229000000.000000+000",  // not a leap year, at the end of a century
              "20240431000000.000000+000",
              "20241301000000.000000+000",
              "20240001000000.000000+000",
@@ -75,7 +75,7 @@ TEST(CimDateTime, FormatsNoYearsBelow0OrAbove9999) {
     EXPECT_EQ(formatPointInTime(0, 1000), "");
 }
 
-TEST(CimDateTime, MayHaveAsterisksFromSomeFieldOn) {
+TEST(CimDateTime, AcceptsAsterisksInTheLastFields) {
     for (const char* string : {"20240101******.******+000", "20240101000000.123***-060", "20260131******.******+000",
                                "2026**********.******+000", "**************.******+000"}) {
         EXPECT_TRUE(isDateTime(string)) << string;
@@ -87,14 +87,14 @@ TEST(CimDateTime, MayHaveAsterisksFromSomeFieldOn) {
     }
 }
 
-TEST(CimDateTime, HasNoAsterisksBeforeDigitsInsideAFieldOrInTheOffset) {
+TEST(CimDateTime, RejectsAsterisksInOtherPlaces) {
     for (const char* string : {"2024**01000000.000000+000", "202401010000**.000000+000", "2026013112000*.******+000",
                                "20260131120000.1*0000+000", "20260131120000.000000+***"}) {
         EXPECT_FALSE(isDateTime(string)) << string;
     }
 }
 
-TEST(CimDateTime, IsNoOtherString) {
+TEST(CimDateTime, RejectsOtherStrings) {
     for (const char* string : {"", "2026-01-31", "20260131120000.000000+06", "20260131120000.000000+0600",
                                "20260131120000,000000+060", "20260131120000.000000 060", "2026013112000x.000000+060",
                                "20260131120000.00000x+060", "20260131120000.000000+0x0", "00000001250000.000000:000",
@@ -104,7 +104,7 @@ TEST(CimDateTime, IsNoOtherString) {
     EXPECT_TRUE(isDateTime("00000000000000.000000:000"));
 }
 
-TEST(CimDateTime, HasAConstantForNoDate) {
+TEST(CimDateTime, RecognizesTheRepresentationsOfNoDate) {
     EXPECT_TRUE(cim::isNoDate(cim::noDate));
     EXPECT_TRUE(cim::isNoDate("00000000000000.000000+000"));
     EXPECT_FALSE(cim::isNoDate("00000101000000.000000+000"));

@@ -4,7 +4,7 @@
 
 #include "cim/Names.h"
 
-TEST(CimNames, AreTheSameInAnyCaseOfLetters) {
+TEST(CimNames, AreEqualInAnyLetterCase) {
     EXPECT_TRUE(cim::sameName("VELKO_Lease", "velko_LEASE"));
     EXPECT_TRUE(cim::sameName("", ""));
     EXPECT_FALSE(cim::sameName("VELKO_Lease", "VELKO_Leases"));
@@ -13,7 +13,7 @@ TEST(CimNames, AreTheSameInAnyCaseOfLetters) {
     EXPECT_FALSE(cim::sameName("\xC3\x84", "\xC3\xA4")) << "only the letters A to Z have a case";
 }
 
-TEST(CimNames, AreKeysWithoutCase) {
+TEST(CimNames, AreCaseInsensitiveMapKeys) {
     std::map<std::string, int, cim::NameLess> numbers{{"Name", 1}, {"other", 2}};
     EXPECT_EQ(numbers.count("NAME"), 1U);
     EXPECT_EQ(numbers.begin()->first, "Name");

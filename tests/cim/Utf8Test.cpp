@@ -45,7 +45,7 @@ INSTANTIATE_TEST_SUITE_P(
                     Case{"truncated", "\xE2\x82x", 0xE2, 1, false},
                     Case{"never a first byte", "\xFF", 0xFF, 1, false}));
 
-TEST(Utf8, IsDecodedAsItIsEncoded) {
+TEST(Utf8, DecodingRevertsEncoding) {
     for (const std::uint32_t codePoint :
          {0x00U, 0x7FU, 0x80U, 0x7FFU, 0x800U, 0xD7FFU, 0xE000U, 0xFFFFU, 0x10000U, 0x10FFFFU}) {
         std::string bytes;
@@ -65,13 +65,13 @@ TEST(Utf8, HasNoSurrogatesAndEndsAtPlaneSixteen) {
     EXPECT_TRUE(cim::isCodePoint(0x10FFFF));
 }
 
-TEST(Utf8, IsInvalidFromTheFirstByteOfABrokenCharacter) {
+TEST(Utf8, FindsTheFirstInvalidCharacter) {
     EXPECT_EQ(cim::findInvalidUtf8(""), std::string_view::npos);
     EXPECT_EQ(cim::findInvalidUtf8("a\xC3\xA9\xE2\x82\xAC"), std::string_view::npos);
     EXPECT_EQ(cim::findInvalidUtf8("a\xC3\xA9\xE2\x82"), 3U);
 }
 
-TEST(Utf8, IsMadeOfAnyBytesByReplacementCharacters) {
+TEST(Utf8, ReplacesInvalidBytes) {
     struct {
         const char* bytes;
         const char* replaced;

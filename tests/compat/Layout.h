@@ -11,7 +11,7 @@
 template <class Actual, class Expected>
 constexpr bool sameType = std::is_same_v<std::remove_cv_t<Actual>, Expected>;
 
-/** Checks that a structure has the tag that the linker sees and that size. */
+/** Checks the tag of a structure, which is part of mangled names, and its size. */
 #define LAYOUT_SIZE(type, bytes)                                             \
     static_assert(std::is_same_v<type, decltype(_##type{})>, #type ": tag"); \
     static_assert(sizeof(type) == (bytes), #type ": size");                  \
@@ -33,7 +33,7 @@ constexpr bool sameType = std::is_same_v<std::remove_cv_t<Actual>, Expected>;
     LAYOUT_MEMBER(type, hdl, 0, handle);  \
     LAYOUT_MEMBER(type, ft, sizeof(void*), type##FT*)
 
-/** Checks a table with that number of slots, the first of which contains the version. */
+/** Checks that a table has this number of slots, the first of which contains the version. */
 #define LAYOUT_TABLE(type, slots)               \
     LAYOUT_SIZE(type, (slots) * sizeof(void*)); \
     LAYOUT_MEMBER(type, ftVersion, 0, int)

@@ -10,7 +10,7 @@
 #include "support/TemporaryDirectory.h"
 #include "support/UnderTest.h"
 
-// lease-warranty-data with record files that the gate has written.
+// Tests lease-warranty-data with record files that the gate has written.
 
 namespace gatetest {
 namespace {
@@ -70,7 +70,7 @@ protected:
 
 // --- export and import ---------------------------------------------------------------------------------------------
 
-TEST_F(DataTest, AnImportedExportIsTheSameFile) {
+TEST_F(DataTest, ImportingAnExportRestoresTheFile) {
     writeFile(leases(), std::regex_replace(content, std::regex("Co\n"), "Co\x01\xC3(_\xFF\n"));
     const std::string changed = readFile(leases());
     const std::string exportedLeases = run("export VELKO_Lease").output;
@@ -256,7 +256,7 @@ TEST_F(DataTest, AMissingFileWithASavedCopyAndAnUnfinishedChangeAreReported) {
     EXPECT_THAT(run("check"), hasEnded(1, "Lease.dat was missing. The gate or the command restore will restore it."));
 }
 
-TEST_F(DataTest, ValuesThatTheProviderReadsOtherwiseAreReportedAndNotExported) {
+TEST_F(DataTest, ValuesThatTheProviderReadsDifferentlyAreReportedAndNotExported) {
     const auto edited = [&](const char* pattern, const char* replacement) {
         return std::regex_replace(content, std::regex(pattern), replacement, std::regex_constants::format_first_only);
     };
@@ -291,7 +291,7 @@ TEST_F(DataTest, RestoreReplacesAnEditedFile) {
     EXPECT_THAT(identifiers(), ElementsAre("L1", "L 2"));
 }
 
-TEST_F(DataTest, RestoreOfAMissingOrEmptyFileKeepsNoFormerOne) {
+TEST_F(DataTest, RestoringAMissingOrEmptyFileKeepsNoFormerFile) {
     const std::string saved = content + "saved copy 1 of Lease.dat\n";
     removeCopies();
     for (const bool isEmpty : {false, true}) {

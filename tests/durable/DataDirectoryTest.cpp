@@ -82,7 +82,7 @@ private:
     pid_t other = 0;
 };
 
-TEST_F(DataDirectoryTest, WithoutLocksIsUsedAndReportedOnce) {
+TEST_F(DataDirectoryTest, IsUsedAndReportedOnceIfTheFileSystemHasNoLocks) {
     const LockErrors errors{ENOSYS, 100};
     EXPECT_TRUE(directory.open());
     for (int time = 0; time < 3; ++time) {
@@ -102,7 +102,7 @@ TEST_F(DataDirectoryTest, IsNotChangedIfTheLockFails) {
     EXPECT_THAT(messages, IsEmpty());
 }
 
-TEST_F(DataDirectoryTest, MayNotBeReadWhileAFileWasJustChangedByAnotherProcess) {
+TEST_F(DataDirectoryTest, IsNotOpenedIfAnotherProcessHasJustChangedAFile) {
     EXPECT_TRUE(directory.open()) << "as its owner";
     directory.close();
     lockByOther();
@@ -114,7 +114,7 @@ TEST_F(DataDirectoryTest, MayNotBeReadWhileAFileWasJustChangedByAnotherProcess) 
     EXPECT_TRUE(directory.open()) << "the time is wrong";
 }
 
-TEST_F(DataDirectoryTest, MayNotBeReadWhileAFileIsIncompleteAndAnotherProcessIsTheOwner) {
+TEST_F(DataDirectoryTest, IsNotOpenedIfAFileIsIncompleteAndAnotherProcessIsTheOwner) {
     const RecordFile warranties = recordFileIn(path, "Warranty.dat");
     warranties.prepare(oneWarranty);
     lockByOther();
@@ -125,8 +125,8 @@ TEST_F(DataDirectoryTest, MayNotBeReadWhileAFileIsIncompleteAndAnotherProcessIsT
     EXPECT_THAT(messages, IsEmpty());
 }
 
-TEST_F(DataDirectoryTest, MayNotBeReadWhileAFileIsIncompleteAndItsCopyCannotBeRead) {
-    std::filesystem::create_directory(file().string() + ".saved1");  // cannot be read, also by root
+TEST_F(DataDirectoryTest, IsNotOpenedIfAFileIsIncompleteAndItsCopyCannotBeRead) {
+    std::filesystem::create_directory(file().string() + ".saved1");  // cannot be read, not even by root
     lockByOther();
     EXPECT_TRUE(directory.open()) << "the file is complete";
     testsupport::writeFile(file(), "1\nW1\n");

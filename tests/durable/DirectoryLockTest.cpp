@@ -96,7 +96,7 @@ TEST_F(DirectoryLockTest, EndsWithItsProcess) {
     close(ready[1]);
 }
 
-TEST_F(DirectoryLockTest, AForkedChildNeitherHoldsNorKeepsIt) {
+TEST_F(DirectoryLockTest, AForkedChildNeitherHoldsNorKeepsTheLock) {
     held.acquire(path);
     EXPECT_EQ(inChild([&] { return static_cast<int>(held.acquire(path).state); }),
               static_cast<int>(State::heldByOther));
@@ -120,14 +120,14 @@ TEST_F(DirectoryLockTest, ACopiedFileLocksNothing) {
     EXPECT_EQ(held.acquire(path).state, State::acquired);
 }
 
-TEST_F(DirectoryLockTest, FollowsADirectoryThatIsReplaced) {
+TEST_F(DirectoryLockTest, IsAcquiredAgainIfItsFileIsRemoved) {
     held.acquire(path);
     std::filesystem::remove(directory.path() / "owner");
     EXPECT_EQ(held.acquire(path).state, State::acquired);
     EXPECT_EQ(stateInChild(), State::heldByOther);
 }
 
-TEST_F(DirectoryLockTest, IsDeniedToAProcessThatMustNotWriteItsFile) {
+TEST_F(DirectoryLockTest, IsDeniedToAProcessThatCannotWriteItsFile) {
     held.acquire(path);
     held.release();
     std::filesystem::permissions(directory.path(), std::filesystem::perms(0755));

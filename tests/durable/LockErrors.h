@@ -2,7 +2,7 @@
 
 namespace durable {
 
-/** Lets the next attempts to lock a file fail during its lifetime. */
+/** During the lifetime of this object, the next attempts to lock a file fail. */
 struct LockErrors {
     static inline int error = 0;
     static inline int count = 0;

@@ -31,7 +31,7 @@ std::string records(std::initializer_list<const char*> identifiers) {
     return content;
 }
 
-/** The same and one more record, without values, as while it is created. */
+/** The same file with one more record that has no values, as during its creation. */
 std::string recordsAndNew(std::initializer_list<const char*> identifiers) {
     return std::to_string(identifiers.size() + 1) + records(identifiers).substr(1) +
            "new\n*\n00000000000000.000000-000\n0\n";
@@ -52,7 +52,7 @@ protected:
     const fs::path damaged = in("Warranty.dat.damaged");
 };
 
-TEST_F(RecordFileTest, AUserWithAccessToTheFilesOverwritesTheCopiesOfAnother) {
+TEST_F(RecordFileTest, AUserWithAccessToTheFilesOverwritesTheCopiesOfAnotherUser) {
     writeFile(path, records({"W1"}));
     fs::permissions(path, fs::perms(0666));
     prepare();
@@ -76,14 +76,14 @@ TEST_F(RecordFileTest, AUserWithAccessToTheFilesOverwritesTheCopiesOfAnother) {
     EXPECT_EQ(fs::status(saved).permissions(), fs::perms(0666));
 }
 
-TEST_F(RecordFileTest, AFileIsCompleteIfItHasThePromisedLines) {
+TEST_F(RecordFileTest, AFileIsCompleteIfItHasAllLinesThatItsCountDeclares) {
     for (const std::string& content : {records({"W1", "W2"}), records({}), std::string("0"), "\n " + records({"W1"}),
                                        "+" + records({"W1"}), records({"W1"}) + "a later line\n"}) {
         EXPECT_TRUE(file.isComplete(content)) << content;
     }
 }
 
-TEST_F(RecordFileTest, AFileIsIncompleteIfItIsCutOrHasNoCount) {
+TEST_F(RecordFileTest, AFileIsIncompleteIfItIsTruncatedOrHasNoCount) {
     const std::string content = records({"W1", "W2"});
     for (std::size_t length = 0; length < content.size(); ++length) {
         EXPECT_FALSE(file.isComplete(content.substr(0, length))) << length;
@@ -151,7 +151,7 @@ TEST_F(RecordFileTest, AMissingOrEmptyFileIsRestored) {
     }
 }
 
-TEST_F(RecordFileTest, ACompleteFileWinsOverANewerSavedCopy) {
+TEST_F(RecordFileTest, ACompleteFileIsPreferredToANewerSavedCopy) {
     writeFile(path, records({"W1"}));
     prepare();
     writeFile(path, records({"by_hand"}));
@@ -186,7 +186,7 @@ TEST_F(RecordFileTest, ASavedCopyOfAnotherClassIsNotUsed) {
     EXPECT_EQ(readFile(path), "2\nW1\n");
 }
 
-TEST_F(RecordFileTest, ASavedCopyThatIsCutIsNotUsed) {
+TEST_F(RecordFileTest, ATruncatedSavedCopyIsNotUsed) {
     writeFile(path, records({"W1", "W2"}));
     prepare();
     const std::string complete = readFile(saved);
@@ -197,7 +197,7 @@ TEST_F(RecordFileTest, ASavedCopyThatIsCutIsNotUsed) {
     }
 }
 
-TEST_F(RecordFileTest, WithoutSavedCopyTheIncompleteFileStaysAndIsKept) {
+TEST_F(RecordFileTest, AnIncompleteFileWithoutSavedCopyStaysAndIsCopied) {
     writeFile(path, records({"W1", "W2"}).substr(0, 45));
     EXPECT_THAT(file.recover(), AllOf(HasSubstr("records declared: 2, present: 1"), HasSubstr(damaged.string())));
     EXPECT_EQ(readFile(path), records({"W1", "W2"}).substr(0, 45));
@@ -257,7 +257,7 @@ TEST_F(RecordFileTest, TheTargetOfASymbolicLinkIsProtected) {
     EXPECT_EQ(readFile(target), records({"W1"}));
 }
 
-TEST_F(RecordFileTest, TheCopiesOfATargetWithWordsOfTheirLastLineInItsNameAreUsed) {
+TEST_F(RecordFileTest, CopiesAreUsedIfTheFileNameHasWordsOfTheirLastLine) {
     for (const char* name : {"records of 2026", "saved copy 1", "x of Warranty.dat, in use"}) {
         fs::remove(path);
         writeFile(in(name), records({"W1"}));
@@ -277,7 +277,7 @@ TEST_F(RecordFileTest, WithoutAnyFileThereIsNothingToRecover) {
     EXPECT_TRUE(fs::is_empty(directory.path()));
 }
 
-TEST_F(RecordFileTest, AnUnfinishedCreationIsNotTakenForAnAnsweredOne) {
+TEST_F(RecordFileTest, AnUnfinishedCreationIsRolledBack) {
     writeFile(path, records({"W1"}));
     prepare();
     writeFile(path, recordsAndNew({"W1"}));
@@ -298,7 +298,7 @@ TEST_F(RecordFileTest, AnUnfinishedCreationAfterAnEditIsRecognized) {
     }
 }
 
-TEST_F(RecordFileTest, AnotherCompleteFileIsKeptAlthoughItsCopiesAreInUse) {
+TEST_F(RecordFileTest, AnEditedCompleteFileIsKeptAlthoughItsCopiesAreInUse) {
     for (const std::string& edited : {records({"W1"}), records({"W1", "W2"}), records({"W1", "W2", "W3"}), records({}),
                                       std::string("0"), recordsAndNew({"W1", "W2"}), recordsAndNew({})}) {
         writeFile(path, records({"W1"}));
@@ -353,7 +353,7 @@ TEST_F(RecordFileTest, ACommittedCreationIsSaved) {
     EXPECT_EQ(file.savedCopy().content, recordsAndNew({"W1"}));
 }
 
-TEST_F(RecordFileTest, AChangeIsRolledBackWhateverTheSavedCopyIs) {
+TEST_F(RecordFileTest, AChangeIsRolledBackBeforeAndAfterItsCommit) {
     const std::string before = records({"W1"});
     const std::string after = records({"W1", "W2"});
     for (const bool isCommitted : {false, true}) {

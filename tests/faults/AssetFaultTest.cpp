@@ -102,7 +102,10 @@ TEST_F(AssetFaultTest, OnlyAnUnreadableFileLosesUnsetValues) {
         << "all operations that read the file and none that write it";
 }
 
-/** The second fault hits operations that follow only after a failure, such as a rollback. */
+/**
+ * The second fault applies to all later operations of its kind, including those that run only after a failure, such as
+ * the removal of the temporary file.
+ */
 TEST_F(AssetFaultTest, ASecondFailureLeavesAtMostATemporaryFile) {
     int left = 0;
     const auto failTwice = [&](const Fault& first) {
@@ -127,7 +130,7 @@ TEST_F(AssetFaultTest, ASecondFailureLeavesAtMostATemporaryFile) {
     EXPECT_GT(left, 0);
 }
 
-/** Target of the link that is created in place of each new file. */
+/** The target of the links that are created at the paths of new files. */
 fs::path* plantedTarget = nullptr;
 
 void plant(const char* path) {

@@ -10,7 +10,7 @@ struct ExpectedOutcome {
     ObservedResponse response;
     testsupport::Outcome withoutAsset;   ///< for asset data: the outcome if asset.dat cannot be read (docs/classes)
     testsupport::Outcome withoutSystem;  ///< likewise, if the instrumentation has no system node either
-    std::string file;                    ///< the file that the request changes; Lease.dat if it only reads
+    std::string file;                    ///< the file that the request changes; Lease.dat if the request only reads
     Lines before;                        ///< instances of the file's class before the request
     Lines after;
     std::string fileBefore;
@@ -22,7 +22,8 @@ ExpectedOutcome runWithoutFaults(TestEnvironment& environment, const RequestCase
 
 /**
  * Expects a part of the results of the request without faults, or with an unreadable asset.dat: a subsequence of the
- * instances or paths, with some of their values or with null values. If memory is short, the system may be unknown too.
+ * instances or paths, with some of their values or with null values. If memory is short, also accepts the results
+ * without a system node.
  */
 void expectPartOfAnswer(const ExpectedOutcome& expected, const testsupport::Outcome& outcome, bool lacksMemory = false);
 
@@ -39,8 +40,8 @@ bool preventsReading(const Fault& fault);
 std::string assetWithFields(const ExpectedOutcome& expected, std::size_t readFields);
 
 /**
- * Expects that asset.dat is as before, as after or, if the fault may have prevented reading it, as assetWithFields()
- * returns.
+ * Expects that asset.dat has its content from before or after the request. If the fault may have prevented reading it,
+ * also accepts the contents that assetWithFields() returns.
  */
 void expectAssetFile(const ExpectedOutcome& expected, const Fault& fault, const std::string& content);
 

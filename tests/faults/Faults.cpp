@@ -20,12 +20,12 @@ namespace faults {
 namespace {
 
 constexpr std::array<const char*, operationKinds + 1> operationNames{
-    "allocation", "taking of memory", "opening",        "reading",  "writing",
-    "seeking",    "syncing",          "renaming",       "removing", "closing",
-    "asking",     "owning",           "path resolving", "locking",  "operation on files",
+    "allocation",   "malloc call",      "opening",        "reading",  "writing",
+    "seeking",      "syncing",          "renaming",       "removing", "closing",
+    "status query", "attribute change", "path resolving", "locking",  "operation on files",
 };
 
-/** The faults of this thread. The functions that use it do not allocate. */
+/** The fault injection of this thread. Functions that use this state do not allocate memory. */
 struct State {
     bool armed = false;
     const Fault* fault = nullptr;

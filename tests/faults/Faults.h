@@ -37,7 +37,7 @@ struct Failure {
 struct Fault {
     OperationKind kind = operationAllocate;
     int number = 1;
-    bool lasting = false;  ///< fails all later operations of the kind, too
+    bool lasting = false;  ///< all later operations of the kind fail, too
     int error = 0;         ///< see Failure
 
     /** Called at that operation instead of a failure. */
@@ -80,9 +80,9 @@ std::vector<Failure> allFailures();
 
 /** Selects faults. */
 struct FaultSelection {
-    bool lasting = true;                               ///< also each failure with all later operations of the kind
+    bool lasting = true;  ///< includes faults after which all later operations of the kind fail
     int operations = std::numeric_limits<int>::max();  ///< maximum number of operations per kind, evenly spaced
-    bool withSanitizers = false;                       ///< also with sanitizers
+    bool withSanitizers = false;                       ///< with sanitizers, tests as many operations as without
 };
 
 /**
@@ -92,7 +92,7 @@ struct FaultSelection {
 void eachFault(const Counts& counts, const std::vector<Failure>& failures,
                const std::function<void(const Fault&)>& body, const FaultSelection& selection = {});
 
-/** Calls `body` for each operation on files as the time of another event. The faults have no error. */
+/** Calls `body` with a fault for each operation on files, as the time of another event. The faults have no error. */
 void eachMoment(const Counts& counts, const std::function<void(const Fault&)>& body);
 
 /** Returns the number of open file descriptors of this process. */

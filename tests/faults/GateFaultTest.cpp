@@ -7,8 +7,8 @@
 #include "ExpectedOutcome.h"
 #include "Killing.h"
 
-// Changes through the gate while file operations fail: success means that everything is stored, any other status that
-// nothing changed.
+// Changes through the gate while file operations or allocations fail: success means that everything is stored, any
+// other status means that nothing is changed.
 
 namespace faults {
 namespace {
@@ -42,7 +42,7 @@ protected:
 
     void failOne(const Fault& fault) {
         environment.restart();
-        now();  // loads the provider: GateLoadFaultTest is about faults while it reads its files
+        now();  // loads the provider; GateLoadFaultTest tests faults during loading
         const ObservedResponse response = environment.ask(request(), &fault);
         EXPECT_FALSE(response.outcome.threw);
         EXPECT_EQ(response.leakedDescriptors, 0);
@@ -62,7 +62,10 @@ protected:
         EXPECT_EQ(environment.files().at(file()), expected.fileAfter);
     }
 
-    /** Expects the instances before the change, or those that the message admits; also after a restart. */
+    /**
+     * Expects the instances from before the change. If the message says that the rollback failed, also accepts those
+     * from after the change. Expects the same instances after a restart.
+     */
     void expectRolledBack(const Fault& fault, const std::string& message) {
         const bool isAdmitted = message.find("could not be rolled back") != std::string::npos;
         EXPECT_TRUE(fault.lasting || !isAdmitted) << message;

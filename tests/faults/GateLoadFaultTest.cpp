@@ -9,8 +9,8 @@
 #include "durable/RecordFile.h"
 #include "operations/LoadedLibrary.h"
 
-// The gate reads an incomplete record file, when it is loaded or becomes the owner of the data directory, while file
-// operations or allocations fail: whatever it then answers, no record is lost. So does an import.
+// File operations or allocations fail while the gate reads an incomplete record file, when it is loaded or becomes the
+// owner of the data directory: whatever the gate responds, no record is lost. A failing import loses no record either.
 
 namespace faults {
 namespace {
@@ -18,7 +18,7 @@ namespace {
 constexpr int preparedRecords = 4;
 constexpr FaultSelection someOnce{false, 200};  ///< selects allocations
 
-/** Without malloc: the C library cannot load libraries correctly after it has run out of memory. */
+/** Does not include malloc: the C library cannot load libraries correctly after it has run out of memory. */
 const std::vector<Failure> allocationFailures{{operationAllocate, 0}};
 
 class GateLoadFaultTest : public testing::Test {
@@ -49,7 +49,7 @@ protected:
         return environment.ask(otherChangeOf(leaseFile), fault);
     }
 
-    /** Loads the gate and connects it. Returns the operations that it needs. */
+    /** Loads the gate and creates its interface. Returns the operation counts. */
     Counts load(const Fault* fault) {
         const FaultInjection injection = fault == nullptr ? FaultInjection() : FaultInjection(*fault);
         bool isConnected = false;
@@ -71,7 +71,10 @@ protected:
         return lines;
     }
 
-    /** Expects the leases after the change if it was answered OK or its message admits that, otherwise those before. */
+    /**
+     * Expects the leases from after the change if its status is OK, otherwise those from before it. If the message says
+     * that the rollback failed, accepts both.
+     */
     void expectStored(const ObservedResponse& response, const Lines& after, const Lines& before) {
         EXPECT_FALSE(response.outcome.threw);
         environment.unload();
@@ -84,7 +87,7 @@ protected:
     TestEnvironment environment;
 };
 
-TEST_F(GateLoadFaultTest, NoRecordIsLostWhateverFailsWhileItIsLoaded) {
+TEST_F(GateLoadFaultTest, NoRecordIsLostIfAnOperationFailsWhileTheGateIsLoaded) {
     restart();
     const Counts counts = load(nullptr);
     const Lines complete = leases();
@@ -100,7 +103,7 @@ TEST_F(GateLoadFaultTest, NoRecordIsLostWhateverFailsWhileItIsLoaded) {
     eachFault(counts, allocationFailures, failOne, someOnce);
 }
 
-TEST_F(GateLoadFaultTest, NoRecordIsLostWhateverFailsWhileItBecomesTheOwner) {
+TEST_F(GateLoadFaultTest, NoRecordIsLostIfAnOperationFailsWhileTheGateBecomesTheOwner) {
     const Counts counts = changeAfterOtherOwner(nullptr).counts;
     const Lines changed = leases();
     restart();
@@ -111,7 +114,7 @@ TEST_F(GateLoadFaultTest, NoRecordIsLostWhateverFailsWhileItBecomesTheOwner) {
     eachFault(counts, allocationFailures, failOne, someOnce);
 }
 
-TEST_F(GateLoadFaultTest, AnImportLeavesTheReplacedOrTheNewRecordsWhateverFails) {
+TEST_F(GateLoadFaultTest, AFailingImportLeavesTheOldOrTheNewRecords) {
     const std::string imported = leaseRecords(1);
     const durable::RecordFile file = durable::recordFileIn(environment.dataDirectory().string() + "/", leaseFile);
     Counts counts;

@@ -1,4 +1,4 @@
-// Kills processes that create, modify and delete, and reports the state of their files.
+// Kills processes that create, modify and delete records, and reports the state of their files.
 //
 // Usage: kill_run [--counted] KILLS [SEED]
 //   --counted  kills after a number of file operations that depends on the seed instead of at a random time, so that
@@ -39,7 +39,7 @@ std::string valueOf(int step) {
     return "written by step " + std::to_string(step);
 }
 
-/** Returns a step of the load: modifies asset data or a lease, creates a warranty or deletes it, in turn. */
+/** Returns a step of the load. In turn, the steps modify asset data or a lease, create a warranty, and delete it. */
 RequestCase stepOf(int step) {
     const auto with = [](const char* request, const std::string& identifier, std::vector<cimhost::NamedValue> values) {
         RequestCase made = requestNamed(request);

@@ -8,8 +8,8 @@
 
 #include "TestEnvironment.h"
 
-// Operations and allocations fail while the library is loaded. The agent then reads its configuration and the provider
-// its record files. Without the configuration, the agent uses another data directory, which has no files.
+// File operations and allocations fail while the library is loaded: the agent reads its configuration, and the provider
+// its record files. Without the configuration, the agent uses its default data directory, which has no files.
 
 namespace faults {
 namespace {
@@ -57,7 +57,7 @@ protected:
     }
 
     /**
-     * Expects all or no records of each class after each fault, and all records if a failed call is only to be
+     * Expects all or no records of each class after each fault, and all records if the failed call only has to be
      * repeated.
      */
     void failEach(const std::vector<Failure>& failures, const FaultSelection& selection) {

@@ -184,7 +184,7 @@ static int predictableTemporary(char* pattern, int flags) {
         return failure.error != 0 ? -1 : 0;                               \
     }
 
-/** Defines a function that locks a file. Other commands of it do not fail. */
+/** Defines a function that locks a file. Its other commands do not fail. */
 #define INTERPOSE_LOCK(name)                                                    \
     VISIBLE int name(int file, int command, ...) {                              \
         va_list rest;                                                           \

@@ -1,8 +1,8 @@
 #pragma once
 
 /*
- * Interposes functions of the C library. The library defines them under their own names and must be linked before all
- * others, so that the libraries under test call them.
+ * Interposes functions of the C library. This library defines functions of the same names and must be linked before all
+ * others, so that the libraries under test call its functions.
  */
 
 #ifdef __cplusplus

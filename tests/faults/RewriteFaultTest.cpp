@@ -79,7 +79,7 @@ TEST_F(RewriteFaultTest, AFullDiskKeepsTheLinesWrittenBefore) {
     }
 }
 
-TEST_F(RewriteFaultTest, AFailedLineIsTheLast) {
+TEST_F(RewriteFaultTest, AFailedLineIsTheLastOneInTheFile) {
     const std::string whole = completeFile();
     for (int number = 1; number <= writesOfRewrite; ++number) {
         ASSERT_EQ(rewriteWith(writeFailing(number, false)), firstLines(whole, number))
@@ -176,7 +176,7 @@ TEST_F(RewriteFaultTest, CorrectingTheCountKeepsAllCompleteRecords) {
               std::to_string(intact) + firstLines(rest, 1 + intact * linesOfLease).substr(2));
 }
 
-/** A rewrite of either class. */
+/** Rewrites of the record file of each class. */
 class OperationsOfRewriteTest : public testing::TestWithParam<const char*> {};
 
 TEST_P(OperationsOfRewriteTest, AreOneOpenOneWritePerLineAndOneClose) {

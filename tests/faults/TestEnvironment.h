@@ -36,7 +36,7 @@ struct RequestCase {
     cimhost::ObjectPath path;
     cimhost::Instance instance;
     CMPIStatus (*call)(const Arguments& with);
-    const char* changes = nullptr;  ///< the data file that it changes; null if it only reads
+    const char* changes = nullptr;  ///< the data file that the request changes; null if it only reads
 };
 
 std::ostream& operator<<(std::ostream& stream, const RequestCase& request);

@@ -49,7 +49,7 @@ protected:
         return response.outcome;
     }
 
-    /** The directory returns without files: then each record is stored by the next change, or requests are refused. */
+    /** Restores the directory without files. The next change must store each record, or be refused. */
     void returnEmptyAfter(const Fault& moment) {
         const bool isAnswered = askWhileVanishing(&moment).rc == CMPI_RC_OK;
         fs::remove_all(away());

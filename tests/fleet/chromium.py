@@ -1,4 +1,4 @@
-"""Drives a headless Chromium over its debugging pipe: no port, no driver."""
+"""Drives a headless Chromium over its debugging pipe, without a port or a driver program."""
 
 import base64
 import json
@@ -16,7 +16,7 @@ OPTIONS = ["--headless=new", "--remote-debugging-pipe", "--no-first-run", "--dis
 
 
 class Chromium:
-    """One page. Records its requests and the errors that it reports."""
+    """A browser with one page. Records the requests of the page and the errors that the browser reports."""
 
     def __init__(self):
         self.profile = tempfile.TemporaryDirectory(ignore_cleanup_errors=True)
@@ -143,5 +143,5 @@ class Chromium:
         path.write_bytes(base64.b64decode(self.send("Page.captureScreenshot", format="png")["data"]))
 
     def print(self):
-        """The page as PDF."""
+        """Returns the page as PDF."""
         return base64.b64decode(self.send("Page.printToPDF", printBackground=True)["data"])

@@ -1,4 +1,4 @@
-"""A machine for the fleet tools: an agent with temporary data, the real cimhost with the gate or the bare provider."""
+"""A machine for the fleet tools: an agent with temporary data, and cimhost with the gate or the bare provider."""
 
 import json
 import pathlib
@@ -36,7 +36,7 @@ class Fleet(Environment):
             self.cimhost("mi", path, *(f"{name}={value}" for name, value in values.items()))
 
     def fill(self):
-        """A lease, a warranty and asset data, as a machine has them."""
+        """Stores a lease, a warranty and asset data. Returns the machine."""
         self.create("VELKO_Lease", THIS_COMPUTER, LEASE)
         self.create("VELKO_Warranty", THIS_COMPUTER, WARRANTY)
         self.cimhost("mi", self.cimhost("ein", "VELKO_AssetIDDetails").strip(),
@@ -44,7 +44,7 @@ class Fleet(Environment):
         return self
 
     def program(self, *command):
-        """A finished process, with both streams apart."""
+        """Runs a command. Returns the finished process, with standard output and standard error separate."""
         return subprocess.run([str(word) for word in command], cwd=self.directory, env=self.environment, text=True,
                               stdout=subprocess.PIPE, stderr=subprocess.PIPE, check=False)
 

@@ -1,4 +1,4 @@
-"""Data of many machines that do not exist. The same for each run."""
+"""Generates data of many fictitious machines, which are the same in each run."""
 
 import json
 import random
@@ -17,7 +17,7 @@ def record(chance, party, names, identifier):
 
 
 def data_of(number, chance):
-    """The export of a machine: one in ten has no lease, one in twenty no warranty."""
+    """Returns the export of a machine. One machine in ten has no lease, one in twenty has no warranty."""
     lease = record(chance, {"Lessor": chance.choice(("ACME Leasing Co", "Muster Leasing AG", "Söder & Søn"))},
                    ("BaseTermCommencementDate", "LeaseTerm"), "/system/computer")
     warranty = record(chance, {"Warrantor": chance.choice(("Acme Service", "Beispiel GmbH"))},

@@ -6,14 +6,14 @@
 #include "lab/emulation/RequestAdaptation.h"
 #include "operations/ManagerBehaviour.h"
 
-// The emulation of each object manager, and their common parts.
+// The emulations of object managers, and their common parts.
 
 namespace cimhost::lab {
 
 std::shared_ptr<const ManagerBehaviour> sfcbEmulation();
 std::shared_ptr<const ManagerBehaviour> openPegasusEmulation(CreationKey creationKey);
 
-/** Versions and gaps of SFCB's tables. */
+/** Sets the versions of SFCB's tables, and removes the functions that SFCB does not have. */
 void changeToSfcbTables(FunctionTables& tables);
 
 /** The status of a request that would have ended the manager's provider process. */

@@ -20,7 +20,7 @@ FunctionTables openPegasusTables() {
     return tables;
 }
 
-/** OpenPegasus checks and completes what clients send, and requires that results are returned as they are defined. */
+/** OpenPegasus checks and completes the values that clients send, and rejects results that the standard forbids. */
 class OpenPegasusEmulation : public ManagerBehaviour {
 public:
     explicit OpenPegasusEmulation(CreationKey itsCreationKey) : creationKey(itsCreationKey) {}
@@ -54,7 +54,7 @@ public:
         return rules;
     }
 
-    /** A new thread, also for up-calls. */
+    /** Uses a new thread, also for up-calls. */
     void onRequestThread(const std::function<void()>& callProvider) const override { onNewThread(callProvider); }
 
     using ManagerBehaviour::statusOf;

@@ -56,7 +56,7 @@ Value unsetValue(const PropertyInfo& property, const Value& unsetString) {
     return isSingleString ? unsetString : Value::null(property.type, property.isArray);
 }
 
-/** All properties of the class in its order, then those that it does not have. */
+/** All properties of the class in its order, then the sent properties that the class does not have. */
 std::vector<NamedValue> allProperties(const std::vector<NamedValue>& sent, const ClassInfo& known,
                                       const Value& unsetString) {
     std::vector<NamedValue> all;

@@ -26,7 +26,7 @@ void trimStrings(Request& request, const std::function<bool(char)>& isRemoved);
  */
 void completeInstance(Request& request, const Broker& broker, const Value& unsetString, CreationKey creationKey);
 
-/** Names all properties where the client sent no list, and adds the keys to the list of a modification. */
+/** Lists all properties if the client sent no list. Otherwise, adds the keys to the list of a modification. */
 void completePropertyList(Request& request, const Broker& broker);
 
 }  // namespace cimhost::lab

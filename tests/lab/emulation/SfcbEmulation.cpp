@@ -59,7 +59,7 @@ bool returnedObject(const ProviderResponse& response) {
     });
 }
 
-/** The memory table has marks only. */
+/** Leaves only the functions for marks in the memory table. */
 void leaveMarksOnly(CMPIBrokerMemFT& memory) {
     memory.cmpiMalloc = nullptr;
     memory.cmpiCalloc = nullptr;
@@ -109,7 +109,7 @@ public:
         return refuseStringsForNumbers(request, broker);
     }
 
-    /** Strings lose blanks and other bytes than ASCII at their ends; unset strings are objects, but null. */
+    /** Removes blanks and non-ASCII bytes at the ends of strings. Unset strings become null string objects. */
     void adapt(Request& request, const Broker& broker) const override {
         trimStrings(request, [](char each) { return each == ' ' || static_cast<unsigned char>(each) > 0x7F; });
         completeInstance(request, broker, Value::nullStringObject(), CreationKey::asSent);
@@ -124,7 +124,7 @@ public:
         return rules;
     }
 
-    /** A new thread; an up-call runs on the thread of the provider that makes it. */
+    /** Uses a new thread. An up-call runs on the thread of the provider that makes it. */
     void onRequestThread(const std::function<void()>& callProvider) const override {
         const bool isNested = Broker::arenaOfThread() != nullptr;
         isNested ? callProvider() : onNewThread(callProvider);

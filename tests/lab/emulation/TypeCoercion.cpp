@@ -44,7 +44,7 @@ bool isNumber(CMPIType type) {
     return integerType(type) != nullptr || type == CMPI_real32 || type == CMPI_real64;
 }
 
-/** The same integer with another type; none when it is no integer or does not fit. */
+/** The same integer with another type; none if the value is not an integer or does not fit. */
 std::optional<Scalar> converted(const Scalar& value, const IntegerType& target) {
     return std::visit(
         [&](const auto& each) -> std::optional<Scalar> {

@@ -9,7 +9,7 @@
 
 namespace cimhost::lab {
 
-/** Fails for a string sent for a number: the manager's provider process would have ended. */
+/** Fails if a string is sent for a number, which would crash the manager's provider process. */
 Status refuseStringsForNumbers(Request& request, const Broker& broker);
 
 /** Converts integers to the type of their property; refuses other types, and datetimes that do not exist. */

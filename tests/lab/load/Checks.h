@@ -45,7 +45,7 @@ struct Expectation {
  * "missing" if an instance is missing, "duplicate" if it is listed twice, "deleted" if it was deleted, "unknown" if no
  * client created it, "nameless" if it has no identifier, and "value" as checkInstance().
  * @param instances of an enumeration of paths, instances without properties
- * @param hasProperties whether they have properties
+ * @param hasProperties whether the instances have properties
  */
 CheckResult checkListing(const Expectation& expectation, const std::vector<Instance>& instances, bool hasProperties);
 

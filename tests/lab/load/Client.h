@@ -49,13 +49,13 @@ private:
 
     Response perform(const Request& request);
 
-    /** Checks the status of a response; "died" if it would have crashed the provider's process. */
+    /** Checks the status of a response. Returns "died" if the response would have crashed the provider's process. */
     static CheckResult checkResponse(const Response& response, int code);
 
     const LoadClass& aClass() const { return plan.classes[current.index]; }
     ExpectedState& state() { return known[current.index]; }
     std::string newId();
-    std::string missingId();  ///< of the instance that it deleted last, or that it never creates
+    std::string missingId();  ///< of the instance that the client deleted last, or of one that it never creates
     bool probes() { return state().isEmpty() || (plan.probes && random.oneIn(16)); }
     std::vector<NamedValue> someValues();
 
@@ -67,9 +67,9 @@ private:
     Random random;
     Statistics found;
     std::vector<ExpectedState> known;
-    std::size_t idCount = 0;  ///< identifiers, of all classes
+    std::size_t idCount = 0;  ///< number of identifiers, of all classes
     std::string lastRemoved{};
-    std::size_t requestCount = 0;  ///< requests
+    std::size_t requestCount = 0;  ///< number of requests
     CurrentRequest current{};
 };
 

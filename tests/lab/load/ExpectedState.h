@@ -14,7 +14,7 @@ namespace cimhost::lab {
 /** The expected instances of a class, according to the responses to one client or to all. */
 class ExpectedState {
 public:
-    using Values = std::map<std::string, Value>;  ///< by property; others are unknown
+    using Values = std::map<std::string, Value>;  ///< by property; the values of other properties are unknown
 
     /** @name Changes according to responses */
     ///@{
@@ -31,7 +31,7 @@ public:
     const std::set<std::string>& doubted() const { return doubtful; }
     bool isEmpty() const { return ids.empty(); }
 
-    /** One of the instances. There must be one. */
+    /** Returns a random instance. The state must not be empty. */
     std::string any(Random& random) const { return random.oneOf(ids); }
 
     /** Adds the instances of another state. */

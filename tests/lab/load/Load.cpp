@@ -41,7 +41,7 @@ double runClients(const Clients& clients, std::size_t requests) {
     return std::chrono::duration<double>(std::chrono::steady_clock::now() - begin).count();
 }
 
-/** The expected state of a class, of all clients. */
+/** The expected state of a class according to all clients. */
 ExpectedState stateOf(const Clients& clients, std::size_t index) {
     ExpectedState all;
     for (const auto& client : clients) {
@@ -67,7 +67,7 @@ public:
         note(request, std::move(mismatch));
     }
 
-    /** Deletes the instances of the state, also those that may exist. */
+    /** Deletes the instances of the state, and the doubtful ones, which may exist. */
     void clear(const LoadClass& known, ExpectedState& state) {
         const std::map<std::string, ExpectedState::Values> instances = state.instances();
         for (const auto& [id, values] : instances) {

@@ -13,7 +13,7 @@ namespace cimhost::lab {
 struct LoadClass {
     ObjectPath path{};                          ///< of the class
     std::string key{};                          ///< the only key, a string
-    std::vector<const Property*> modifiable{};  ///< writable properties of types with values
+    std::vector<const Property*> modifiable{};  ///< writable properties whose values the load can generate
 
     ObjectPath instancePath(const std::string& id) const;
 

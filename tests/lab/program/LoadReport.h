@@ -5,7 +5,7 @@
 #include "cli/TextLayout.h"
 #include "lab/load/Report.h"
 
-// The report of a load, for people and for programs; README.md shows both.
+// The report of a load as text and as JSON; README.md shows both.
 
 namespace cimhost::text {
 

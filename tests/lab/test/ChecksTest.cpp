@@ -64,7 +64,7 @@ TEST_F(ChecksTest, AnInstanceHasItsKeyAndTheExpectedValues) {
     EXPECT_EQ(kindOf(checkInstance(known, thing("a"), "a", values)), "value");
     EXPECT_EQ(kindOf(checkInstance(known, thing("b", {text("x")}), "a", values)), "value");
     EXPECT_EQ(kindOf(checkInstance(known, thing("a", {text("x")}), "a", {})), "right")
-        << "what is not known may be any";
+        << "an unknown property can have any value";
     EXPECT_EQ(kindOf(checkInstance(known, {inventoryPath("Inventory_Thing"), {text("x")}}, "a", values)), "value")
         << "no key";
 }
@@ -77,7 +77,7 @@ TEST_F(ChecksTest, AListingHasAllExpectedInstances) {
     EXPECT_EQ(kindOf(checkListing(expectation, {thing("load-c1-1"), thing("load-c1-2")}, false)), "missing");
 }
 
-TEST_F(ChecksTest, AListingHasNothingTwiceAndNothingElse) {
+TEST_F(ChecksTest, AListingHasNoDuplicateAndNoOtherInstance) {
     EXPECT_EQ(listing({thing("load-c1-1")}), "duplicate");
     EXPECT_EQ(listing({thing("load-c1-4")}), "deleted");
     EXPECT_EQ(listing({thing("load-c1-3")}), "right") << "doubtful";
@@ -94,7 +94,7 @@ TEST_F(ChecksTest, AListingOfInstancesHasTheirValues) {
     EXPECT_EQ(kindOf(checkListing(expectation, wrong, false)), "right");
 }
 
-TEST_F(ChecksTest, AssociationsAreThoseOfBefore) {
+TEST_F(ChecksTest, AssociationsAreTheSameAsBefore) {
     EXPECT_EQ(kindOf(checkAssociated({"a", "b"}, {"a", "b"})), "right");
     const CheckResult mismatch = checkAssociated({}, {"a", "b"});
     ASSERT_TRUE(mismatch);

@@ -76,7 +76,8 @@ TEST_F(EmulationChecksTest, AStringForANumberReachesTheProviderOrCrashesItOrIsRe
     const Status refused = modify(Manager::openPegasus, "Size", text("5"));
     EXPECT_EQ(refused.rc, CMPI_RC_ERR_TYPE_MISMATCH);
     EXPECT_THAT(refused.message, HasSubstr("Size"));
-    EXPECT_TRUE(modify(Manager::openPegasus, "Unknown", text("5")).ok()) << "the provider's to judge";
+    EXPECT_TRUE(modify(Manager::openPegasus, "Unknown", text("5")).ok())
+        << "the provider decides about unknown properties";
 }
 
 TEST_F(EmulationChecksTest, AnInvalidDatetimeReachesTheProviderOrIsRejected) {

@@ -54,7 +54,7 @@ TEST_F(EmulationLoadingTest, OfTwoFactoriesOneIsCalledOrNone) {
     EXPECT_THAT(errorOf(Manager::openPegasus, "Other_Thing"), IsEmpty()) << "there is only the generic one";
 }
 
-TEST_F(EmulationLoadingTest, AFunctionThatIsMissingIsMissedAtOnceOrWhenItIsCalled) {
+TEST_F(EmulationLoadingTest, AMissingFunctionFailsAtLoadTimeOrWhenItIsCalled) {
     EXPECT_THAT(errorOf(Manager::standard, "Lazy_Thing"), HasSubstr("undefinedFunction"));
     EXPECT_EQ(errorOf(Manager::sfcb, "Lazy_Thing"), "Provider not found or not loadable");
     EXPECT_THAT(errorOf(Manager::openPegasus, "Lazy_Thing"), IsEmpty());
@@ -111,7 +111,7 @@ TEST_F(EmulationLoadingTest, ACrashLosesTheProvidersMemory) {
     options.behaviour = cimhost::lab::emulationOf(Manager::openPegasus);
     EXPECT_EQ(manager().perform(Request::enumerateInstances(classPath("Sample_Throwing"))).status.rc,
               CMPI_RC_ERR_FAILED);
-    EXPECT_TRUE(isLoaded("libSampleProvider.so")) << "it lives on";
+    EXPECT_TRUE(isLoaded("libSampleProvider.so")) << "it stays loaded";
 }
 
 TEST_F(EmulationLoadingTest, ACrashedLibraryIsUnloadedAfterTheLastRequest) {
@@ -144,7 +144,7 @@ TEST_F(EmulationLoadingTest, StoppingDoesNotWaitForRunningRequests) {
     }
 }
 
-TEST_F(EmulationLoadingTest, FactoriesOfTwoClassesMayRunAtATime) {
+TEST_F(EmulationLoadingTest, FactoriesOfTwoClassesMayRunConcurrently) {
     options.behaviour = cimhost::lab::emulationOf(Manager::sfcb);
     manager();
     std::thread other(

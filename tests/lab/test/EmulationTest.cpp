@@ -146,14 +146,14 @@ TEST_F(EmulationTest, ACreationHasTheSentOrAllProperties) {
               "Echo_Thing.Name=a; Name=a;Text=(null without characters);SIZE=5;");
 }
 
-TEST_F(EmulationTest, CreationMayHaveAKeyThatIsCountedAndCannotBeRead) {
+TEST_F(EmulationTest, ACreationMayHaveAKeyThatIsCountedButCannotBeRead) {
     as(Manager::openPegasus);
     EXPECT_EQ(seenOfCreation({with("Text", text("t"))}), "Echo_Thing.Name=(error 6, null); Name=a;Text=t;Size=(null);");
     manager().perform(Request::getInstance(path("Echo_Thing", "there")));
     EXPECT_THAT(seen(), StartsWith("Echo_Thing.Name=there;")) << "other operations have their keys";
 }
 
-TEST_F(EmulationTest, CreationMayHaveAKeyThatIsEmpty) {
+TEST_F(EmulationTest, ACreationMayHaveAnEmptyKey) {
     as(Manager::openPegasusEmptyKey);
     EXPECT_EQ(seenOfCreation({with("Text", text("t"))}), "Echo_Thing.Name=; Name=a;Text=t;Size=(null);");
 }
@@ -169,7 +169,7 @@ TEST_F(EmulationTest, APathWithoutKeysTakesThemFromTheInstance) {
     EXPECT_THAT(seen(), StartsWith("Echo_Thing.Name=(error 6, null); Name=b;"));
 }
 
-TEST_F(EmulationTest, CreationThatReturnsAPathGivesIt) {
+TEST_F(EmulationTest, ACreationReturnsThePathOfTheProvider) {
     for (const Manager each : cimhost::lab::everyManager) {
         as(each);
         EXPECT_EQ(testsupport::toText(create("Echo_Thing").path()), "root/cimv2:Echo_Thing.Name=\"made\"");
@@ -198,7 +198,7 @@ TEST_F(EmulationTest, APathReplacesARejectedInstance) {
     as(Manager::openPegasus);
     EXPECT_EQ(testsupport::toText(create("Echo_ReturnsBoth").path()), "root/cimv2:Echo_ReturnsBoth.Name=\"made\"");
     as(Manager::sfcb);
-    EXPECT_EQ(create("Echo_ReturnsBoth").path().className, "root/cimv2") << "what comes first counts";
+    EXPECT_EQ(create("Echo_ReturnsBoth").path().className, "root/cimv2") << "the first result counts";
 }
 
 TEST_F(EmulationTest, ACreationWithoutResultCrashesOrBreaksTheResponse) {
@@ -255,7 +255,7 @@ TEST_F(EmulationTest, APropertyListIsNullAsSentOrNamesAllProperties) {
     EXPECT_THAT(seenOfEnumeration({{"Size"}}), testing::EndsWith(",Size;"));
 }
 
-TEST_F(EmulationTest, GetWithoutAnInstanceIsNotFoundAndMayNotBeDone) {
+TEST_F(EmulationTest, GetWithoutAnInstanceIsNotFoundAndMayFailInReturnDone) {
     for (const auto& [each, done] : {std::pair(Manager::standard, "done 0 "), std::pair(Manager::sfcb, "done 0 "),
                                      std::pair(Manager::openPegasus, "done 1 Too few objects delivered.")}) {
         as(each);
@@ -267,7 +267,7 @@ TEST_F(EmulationTest, GetWithoutAnInstanceIsNotFoundAndMayNotBeDone) {
     }
 }
 
-TEST_F(EmulationTest, StringsLoseBlanksAndOtherBytesAtTheirEnds) {
+TEST_F(EmulationTest, StringsLoseBlanksAndNonAsciiBytesAtTheirEnds) {
     const std::vector<cimhost::NamedValue> given{with("Text", text(" \xC3\xA9 a b\xC3\xA9 "))};
     as(Manager::standard);
     EXPECT_THAT(seenOfCreation(given), HasSubstr("Text= \xC3\xA9 a b\xC3\xA9 ;"));
@@ -310,7 +310,7 @@ TEST_F(EmulationTest, AnAssociationClassThatTheClientSentReachesTheProviderAsSen
     }
 }
 
-TEST_F(EmulationTest, ReferencesThatAreNotSupportedMayBeNone) {
+TEST_F(EmulationTest, UnsupportedReferencesMayBeAnEmptyResult) {
     for (const Manager each : {Manager::standard, Manager::sfcb}) {
         as(each);
         EXPECT_EQ(manager().perform(Request::references(path("Echo_Thing", "a"), {})).status.rc,

@@ -47,7 +47,7 @@ TEST(ExpectedState, ADoubtfulInstanceIsUnknown) {
     EXPECT_THAT(state.doubted(), ElementsAre("a", "never made"));
 }
 
-TEST(ExpectedState, TakesOverAnother) {
+TEST(ExpectedState, AddsTheInstancesOfAnother) {
     ExpectedState state;
     state.created("a", {});
     ExpectedState other;

@@ -24,7 +24,7 @@ nlohmann::json reportOf(std::vector<std::string> arguments, int status) {
     return nlohmann::json::parse(ended.output);
 }
 
-TEST(LoadCommand, ReportsFiguresAndSucceedsWhenNoAnswerIsWrong) {
+TEST(LoadCommand, ReportsFiguresAndSucceedsIfNoResponseIsWrong) {
     const ProgramResult ended = runInventory({"load", "Inventory_Thing", "--clients", "4", "--requests", "400"});
     EXPECT_EQ(ended.status, 0);
     EXPECT_EQ(ended.error, "");
@@ -34,7 +34,7 @@ TEST(LoadCommand, ReportsFiguresAndSucceedsWhenNoAnswerIsWrong) {
                       HasSubstr("\nall "), HasSubstr("no answer was wrong\n")));
 }
 
-TEST(LoadCommand, DescribesWrongAnswersAndFails) {
+TEST(LoadCommand, DescribesWrongResponsesAndFails) {
     const ProgramResult ended = runInventory({"load", "Inventory_Liar", "--requests", "400", "--show", "1"});
     EXPECT_EQ(ended.status, 1);
     EXPECT_THAT(ended.error, testing::MatchesRegex("cimhost-lab: [0-9]+ answers were wrong\n"));
@@ -43,7 +43,7 @@ TEST(LoadCommand, DescribesWrongAnswersAndFails) {
                                     HasSubstr("\n    expected: Number = "), HasSubstr("\n    got: Number = ")));
 }
 
-TEST(LoadCommand, IsJsonForPrograms) {
+TEST(LoadCommand, ReportsJson) {
     const auto right = reportOf({"load", "Inventory_Thing", "--clients", "2", "--requests", "200", "--seed", "9"}, 0);
     EXPECT_EQ(right["manager"], "standard");
     EXPECT_EQ(right["clients"], 2);
@@ -59,12 +59,12 @@ TEST(LoadCommand, IsJsonForPrograms) {
     EXPECT_THAT(wrong["wrongAnswers"]["first"][0]["request"], HasSubstr("CreateInstance"));
 }
 
-TEST(LoadCommand, ShowsTenWrongAnswersOrAll) {
+TEST(LoadCommand, ShowsTenWrongResponsesOrAll) {
     const std::vector<std::string> liar{"load", "Inventory_Liar", "--requests", "800"};
     const auto report = reportOf(liar, 1);
     const auto count = report["wrongAnswers"]["count"].get<std::size_t>();
     ASSERT_GT(count, 10U);
-    EXPECT_EQ(report["wrongAnswers"]["first"].size(), count) << "a program gets them all";
+    EXPECT_EQ(report["wrongAnswers"]["first"].size(), count) << "JSON contains all of them";
     const auto shownBy = [&](std::vector<std::string> more) {
         more.insert(more.begin(), liar.begin(), liar.end());
         const std::string output = runInventory(more).output;

@@ -55,7 +55,7 @@ protected:
     LoadAsManager() : LoadTest(GetParam()) {}
 };
 
-TEST_P(LoadAsManager, ARightProviderHasNoWrongAnswer) {
+TEST_P(LoadAsManager, ACorrectProviderHasNoWrongResponse) {
     plan.source = inventoryClass().instancePath("any");
     plan.associationClass = "Inventory_Holds";
     plan.mix = Mix("create=4,modify=5,delete=3,enumerate=1,get=7,associate=2");
@@ -110,7 +110,7 @@ TEST_F(LoadTest, ASingleDefectIsASingleMismatch) {
 }
 
 TEST_F(LoadTest, WithoutProbesOnlyExistingInstancesAreRequested) {
-    EXPECT_THAT(run({"Inventory_Polite"}).kinds, testing::Contains(Key("status"))) << "success for what is not there";
+    EXPECT_THAT(run({"Inventory_Polite"}).kinds, testing::Contains(Key("status"))) << "success for a missing instance";
     plan.probes = false;
     EXPECT_THAT(run({"Inventory_Polite"}).kinds, IsEmpty());
     EXPECT_THAT(run({"Inventory_Liar"}).kinds, testing::Contains(Key("value")));
@@ -122,10 +122,10 @@ TEST_F(LoadTest, AssociationsThatChangeAreWrong) {
     plan.mix = Mix("get=1,associate=1");
     EXPECT_THAT(run().kinds, ElementsAre(Key("association")));
     plan.associationClass = "Inventory_Holds";
-    EXPECT_THAT(run().kinds, IsEmpty()) << "references that are not supported stay so";
+    EXPECT_THAT(run().kinds, IsEmpty()) << "unsupported references are still unsupported";
 }
 
-TEST_F(LoadTest, TheSameSeedIsTheSameLoad) {
+TEST_F(LoadTest, TheSameSeedResultsInTheSameLoad) {
     plan.clients = 1;
     const Report first = run({"Inventory_Liar"});
     const Report second = run({"Inventory_Liar"});
@@ -135,7 +135,7 @@ TEST_F(LoadTest, TheSameSeedIsTheSameLoad) {
     EXPECT_NE(firstOf(run({"Inventory_Liar"})), firstOf(first));
 }
 
-TEST_F(LoadTest, InitialInstancesRemainAndAreNotMistaken) {
+TEST_F(LoadTest, InitialInstancesRemainAndAreNotReportedAsUnknown) {
     manager.perform(Request::createInstance(inventoryClass().instancePath("mine"), {}));
     plan.keeps = true;
     EXPECT_THAT(run().kinds, IsEmpty());
@@ -146,7 +146,7 @@ TEST_F(LoadTest, InitialInstancesRemainAndAreNotMistaken) {
     EXPECT_EQ(countOf("Inventory_Thing"), kept);
 }
 
-TEST_F(LoadTest, RequestsAreSharedOutToTheLast) {
+TEST_F(LoadTest, AllRequestsAreDistributedToTheClients) {
     plan.clients = 7;
     plan.requests = 100;
     EXPECT_EQ(run().all.requests, 100U);
@@ -154,7 +154,7 @@ TEST_F(LoadTest, RequestsAreSharedOutToTheLast) {
     EXPECT_EQ(run().all.requests, 3U);
 }
 
-TEST_F(LoadTest, AFailureBeforeTheLoadIsTheAnswer) {
+TEST_F(LoadTest, AFailureBeforeTheLoadIsReturned) {
     plan.classes = {inventoryClass()};
     plan.classes.front().path.nameSpace = "root/nowhere";
     EXPECT_EQ(runLoad(manager, plan).status.rc, CMPI_RC_ERR_INVALID_NAMESPACE);

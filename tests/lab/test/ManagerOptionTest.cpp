@@ -9,7 +9,7 @@ namespace {
 
 using testing::HasSubstr;
 
-TEST(ManagerOption, TheStandardOneIsTheDefault) {
+TEST(ManagerOption, TheStandardManagerIsTheDefault) {
     EXPECT_EQ(run({"--as", "standard", "ei", "Test_Box"}).output, run({"ei", "Test_Box"}).output);
     const ProgramResult named = run({"ei", "Test_Box", "--as", "pegasus"});
     EXPECT_EQ(named.status, 0);
@@ -46,7 +46,7 @@ TEST(ManagerOption, AModificationHasAllPropertiesAndAList) {
     EXPECT_THAT(pegasus.output, HasSubstr("2. data string \"Size\"\n3. data string \"Name\"\n"));
 }
 
-TEST(ManagerOption, AnotherNameIsWrongUsage) {
+TEST(ManagerOption, AnUnknownNameIsWrongUsage) {
     const ProgramResult refused = run({"--as", "cimom", "ei", "Test_Box"});
     EXPECT_EQ(refused.status, 2);
     EXPECT_THAT(refused.error, HasSubstr("cimom not in {standard,sfcb,pegasus,pegasus-empty-key}"));

@@ -36,7 +36,7 @@ TEST(Mix, ChoosesKindsByWeight) {
     EXPECT_EQ(mix.weight(OperationKind::remove), 0U);
 }
 
-TEST(Mix, UsuallyDoesEverythingButAssociations) {
+TEST(Mix, ByDefaultContainsEverythingExceptAssociations) {
     const Mix mix;
     for (const OperationKind kind : {OperationKind::create, OperationKind::modify, OperationKind::remove,
                                      OperationKind::enumerate, OperationKind::get}) {

@@ -30,7 +30,7 @@ TEST(Percentile, IsTheTimeThatThisShareDoesNotExceed) {
     EXPECT_DOUBLE_EQ(percentile({microseconds(7)}, 0.01), 7);
 }
 
-TEST(Statistics, AddsUp) {
+TEST(Statistics, AddsTheFiguresOfClients) {
     Statistics all(10);
     Statistics one(10);
     one.count(OperationKind::get, microseconds(3), false);
@@ -45,7 +45,7 @@ TEST(Statistics, AddsUp) {
     const Report report = reportOf(all, 2);
     EXPECT_EQ(report.all.requests, 3U);
     EXPECT_EQ(report.all.wrong, 2U);
-    EXPECT_EQ(report.wrong, 3U) << "with what was found at the end";
+    EXPECT_EQ(report.wrong, 3U) << "including the wrong response at the end";
     EXPECT_DOUBLE_EQ(report.all.perSecond, 1.5);
     EXPECT_DOUBLE_EQ(report.all.max, 5);
     ASSERT_EQ(report.operations.size(), 2U);
@@ -55,7 +55,7 @@ TEST(Statistics, AddsUp) {
     EXPECT_THAT(report.kinds, ElementsAre(Pair("deleted", 1), Pair("status", 1), Pair("value", 1)));
 }
 
-TEST(Statistics, DescribesTheFirst) {
+TEST(Statistics, DescribesTheFirstWrongResponses) {
     Statistics all(3);
     Statistics one(3);
     for (std::size_t number = 1; number <= 5; ++number) {
@@ -74,7 +74,7 @@ TEST(Statistics, DescribesTheFirst) {
     EXPECT_EQ(all.wrong(), 7U);
 }
 
-TEST(Statistics, WithoutTimeThereIsNoRate) {
+TEST(Statistics, TheRateIsZeroWithoutTime) {
     const Report report = reportOf(Statistics(1), 0);
     EXPECT_EQ(report.all.perSecond, 0);
     EXPECT_EQ(report.all.max, 0);

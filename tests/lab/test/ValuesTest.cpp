@@ -50,7 +50,7 @@ TEST(MadeValues, DoNotExistForOtherTypes) {
     EXPECT_FALSE(canMakeValue(property(CMPI_string, true)));
 }
 
-TEST(MadeValues, DatesExist) {
+TEST(MadeValues, DatesAreValid) {
     Random random(1, 1);
     for (int i = 0; i < 1000; ++i) {
         const Value value = makeValue(property(CMPI_dateTime), random);

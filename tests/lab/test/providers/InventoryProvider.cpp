@@ -23,7 +23,7 @@ std::mutex mutex;
 std::map<std::string, Store> stores;  ///< by class
 std::map<std::string, int> turns;     ///< number of requests per class
 
-/** Whether the defect of a class applies to this request: to every third one. */
+/** Whether the defect of a class applies to this request. It applies to every third request. */
 bool isDefective(const std::string& asked, const char* className) {
     return asked == className && ++turns[asked] % 3 == 0;
 }
