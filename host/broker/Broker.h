@@ -57,8 +57,7 @@ public:
     /** Allocates zeroed memory, at least one byte; null if out of memory. */
     void* allocate(std::size_t count, std::size_t size);
 
-    /** Like realloc. Changes nothing and returns null if out of memory or if the pointer is not null and not a block.
-     */
+    /** Like realloc. Returns null and changes nothing if the pointer is unknown, or if out of memory. */
     void* resize(void* block, std::size_t size);
 
     /** Frees a block; ignores other pointers. */

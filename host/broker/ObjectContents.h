@@ -53,7 +53,7 @@ struct InstanceContent {
     PropertyList accepted{};                       ///< the property filter; std::nullopt accepts every property
     bool filtersKeys = false;                      ///< whether the filter also applies to keys
     std::size_t initialCount = 0;                  ///< number of properties, all at the front, that the broker added
-    std::size_t unset = 0;  ///< position in the class; no property from there on is set; unused without a class
+    std::size_t unset = 0;  ///< position in the class; no property from there on is set; unused if the class is unknown
 };
 
 /** Content of a CMPIArray: elements of one type. */
@@ -67,10 +67,10 @@ struct EnumerationContent : ArrayContent {
     std::size_t position = 0;
 };
 
-/** Restrictions of a result. It rejects such calls with an error, and they do not become events. */
+/** Special rules of a result. A call that it refuses fails and does not become an event. */
 struct ResultRules {
     bool refusesInstances = false;
-    bool refusesToBeEmpty = false;  ///< rejects returnDone before any result
+    bool refusesToBeEmpty = false;  ///< refuses returnDone before any result
     bool keepsPaths = false;        ///< the provider must not release the paths that it returned
 };
 

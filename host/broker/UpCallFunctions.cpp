@@ -3,7 +3,7 @@
 #include "broker/ErrorTranslation.h"
 #include "broker/FunctionTables.h"
 
-// CMPIBrokerFT: attaches threads, and passes the operations that providers request to UpCalls.
+// CMPIBrokerFT: attaches threads, and passes the requests of providers to UpCalls.
 
 namespace cimhost {
 namespace {

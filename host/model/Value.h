@@ -41,7 +41,7 @@ using Scalar = std::variant<std::monostate, bool, Char16, std::uint8_t, std::uin
 /** The CIM type of a Scalar's alternative, such as CMPI_uint32 for std::uint32_t; CMPI_null for std::monostate. */
 CMPIType typeOf(const Scalar& scalar);
 
-/** Name of a CIM type in MOF, without array brackets; "reference", "instance", "null" or "unknown" for others. */
+/** Name of a CIM type in MOF, without array brackets. Other types are "reference", "instance", "null" or "unknown". */
 std::string_view typeName(CMPIType type);
 
 /** The intrinsic type with this name in MOF, regardless of letter case; none if there is no such type. */
@@ -134,7 +134,7 @@ public:
     Name(std::string itsName) : shared(std::make_shared<const std::string>(std::move(itsName))) {}
     Name(const char* itsName) : Name(std::string(itsName)) {}
 
-    /** Stores a name for the lifetime of the process. Use it only for names that classes declare. */
+    /** Returns a name that is stored until the process ends. Use it only for names that classes declare. */
     static Name declared(const std::string& name);
 
     const std::string& string() const {

@@ -36,7 +36,7 @@ private:
     std::mutex mutex;
     std::condition_variable freed;
     RequestChain owner = nullptr;
-    int depth = 0;  ///< how often the owner has locked the mutex
+    int depth = 0;  ///< number of lock() calls of the owner without their unlock()
 };
 
 }  // namespace cimhost

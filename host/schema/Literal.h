@@ -42,7 +42,7 @@ Scalar typedElement(const Literal& literal, const Property& property, const Sche
 CMPIType literalType(const Literal& literal);
 
 /**
- * Reads a property value from a command line. Strings, datetimes, references and char16 are without quotation marks,
+ * Reads a property value from a command line. Strings, datetimes, references and char16 have no quotation marks,
  * values of other types are literals, and arrays are lists in braces, {"a", "b"}. An empty source is valid only for a
  * string. The value cannot be null.
  * @throws ValueError, PathError with a message that begins with the property's name

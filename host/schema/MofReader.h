@@ -23,7 +23,7 @@ public:
 
     void readFile(const std::filesystem::path& file);
 
-    /** @param sourceName replaces the file name in messages  @param directory included files are relative to it */
+    /** @param sourceName replaces the file name in messages  @param directory base of included files */
     void readSource(std::string_view source, const std::string& sourceName,
                     const std::filesystem::path& directory = {});
 

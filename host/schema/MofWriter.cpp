@@ -37,7 +37,7 @@ std::string formatCharacter(Char16 character) {
     return literal.data();
 }
 
-/** Some compilers accept literals of at most 1,023 bytes. A character has up to six bytes. */
+/** Some compilers accept literals of at most 1,023 bytes. A character is written with up to six. */
 constexpr std::size_t longestLiteral = 1000;
 
 /** The number of bytes of a string that fit into one literal. */

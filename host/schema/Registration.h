@@ -11,7 +11,7 @@ namespace cimhost {
 struct ProviderRegistration {
     std::string className;
     std::string provider;                 ///< name of the provider, prefix of its factory functions
-    std::string location;                 ///< library lib<location>.so; with a slash, a file name
+    std::string location;                 ///< library lib<location>.so, or a file name with a slash
     bool instance = false;                ///< has an instance interface
     bool association = false;             ///< has an association interface
     std::vector<std::string> nameSpaces;  ///< in which the class is served; never empty

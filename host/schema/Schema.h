@@ -80,7 +80,7 @@ struct Method {
     std::vector<Property> parameters{};
 };
 
-/** A class with all its properties: the inherited ones, also if overridden, then the others, as declared. */
+/** A class with all its properties: first the inherited ones, also if overridden, then the others. */
 struct Class {
     std::string name{};
     std::string superclass{};  ///< empty: none
@@ -130,7 +130,7 @@ public:
 
     /**
      * Adds a declaration, or replaces a standard one.
-     * @throws std::invalid_argument if another declaration has the same name
+     * @throws std::invalid_argument if a declaration that is not standard has the same name
      */
     void add(QualifierDeclaration declaration);
 
