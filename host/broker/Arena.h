@@ -10,7 +10,7 @@
 
 namespace cimhost {
 
-/** Owns the encapsulated objects of one request on one thread, and frees them when it is destroyed. Thread-safe. */
+/** Owns encapsulated objects, such as those of one request, and frees them when it is destroyed. Thread-safe. */
 class Arena {
 public:
     /**
@@ -22,7 +22,7 @@ public:
     Arena(const Arena&) = delete;
     Arena& operator=(const Arena&) = delete;
 
-    /** Creates an object with this content. The handle is valid for the lifetime of the arena. */
+    /** Creates an object with this content. The handle is valid as long as the arena owns the object. */
     template <class Handle>
     Handle* make(typename Traits<Handle>::Content&& content) {
         auto object = std::make_unique<Encapsulated<Handle>>(*this, tables, std::move(content));
@@ -36,16 +36,16 @@ public:
         return make<Handle>(typename Traits<Handle>::Content(content));
     }
 
-    /** Marks the current position for releaseMark(). @return owned by the arena */
+    /** Marks the current position for releaseMark(). @return the mark; owned by the arena */
     const void* mark();
 
     /**
-     * Frees the objects created after the mark, except clones, and the later marks.
-     * @return false if it is not a current mark of this arena
+     * Frees the objects created after the mark, except clones. Frees the mark and all later marks.
+     * @return false if the pointer is not a current mark of this arena
      */
     bool releaseMark(const void* mark);
 
-    /** The arena that receives the clones of its objects. */
+    /** The arena that receives the clones of this arena's objects. */
     Arena& clones() const { return cloneArena; }
 
     /** Moves an object from another arena to this one, if the other owns it. */
@@ -62,7 +62,7 @@ private:
     Arena& cloneArena;
     mutable std::mutex mutex;
     std::vector<std::unique_ptr<Object>> objects;
-    std::vector<std::unique_ptr<std::size_t>> marks;  ///< numbers of objects
+    std::vector<std::unique_ptr<std::size_t>> marks;  ///< the number of objects at each mark
 };
 
 }  // namespace cimhost

@@ -40,7 +40,7 @@ BrokerOptions completed(BrokerOptions options) {
     return options;
 }
 
-/** CMPIBroker points to tables without const, although no caller writes to them. */
+/** CMPIBroker has pointers to non-const tables, although no caller writes to the tables. */
 CMPIBroker handleOf(Broker& broker, const BrokerOptions& options) {
     auto& tables = const_cast<FunctionTables&>(*options.tables);
     return {&broker, &tables.broker, &tables.encapsulation, &tables.threads,

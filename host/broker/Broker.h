@@ -33,8 +33,8 @@ public:
     virtual ~UpCalls() = default;
 
     /**
-     * Performs a request. Called on the thread of the provider that sends it, possibly concurrently and from inside
-     * another request; an exception becomes the status CMPI_RC_ERR_FAILED with its message.
+     * Performs a request. Called on the thread of the provider that sends the request, possibly concurrently and during
+     * another request. An exception becomes the status CMPI_RC_ERR_FAILED with the exception's message.
      */
     virtual Response perform(Request request) = 0;
 };
@@ -57,7 +57,7 @@ public:
     /** Allocates zeroed memory, at least one byte; null if out of memory. */
     void* allocate(std::size_t count, std::size_t size);
 
-    /** Like realloc. Returns null and changes nothing if the pointer is not a block, or if out of memory. */
+    /** Like realloc. Returns null and changes nothing if the pointer is unknown, or if out of memory. */
     void* resize(void* block, std::size_t size);
 
     /** Frees a block; ignores other pointers. */
@@ -76,8 +76,8 @@ private:
  * A CMPI broker, through which providers use the object manager. Thread-safe.
  *
  * An object that a provider creates belongs to the innermost request of this broker on the calling thread
- * (RequestScope), or to the attached thread. Other objects and clones are freed with the broker, which must outlive all
- * requests and the providers that have its handle.
+ * (RequestScope), or to the attached thread. Other objects and unreleased clones are freed with the broker. The broker
+ * must outlive all requests and the providers that have its handle.
  */
 class Broker {
 public:
@@ -109,7 +109,7 @@ public:
     /** The arena of clones and of objects that are created outside of requests. */
     Arena& lasting() { return outside; }
 
-    /** The innermost arena of this thread, of any broker; null outside of requests. */
+    /** The arena that this thread entered last, of any broker; null if it has entered none. */
     static Arena* arenaOfThread();
 
     /** The memory that providers allocate. */
@@ -124,8 +124,8 @@ public:
     ///@}
 
     /** @name Threads of a provider
-     * prepareThread() copies a context for a new thread, with a separate arena. attachThread() enters that arena,
-     * detachThread() leaves and frees it; both return false for a context that was not prepared.
+     * prepareThread() copies a context for a new thread and creates an arena for it. attachThread() enters this arena;
+     * detachThread() leaves and frees it. These two return false for a context that prepareThread() did not return.
      */
     ///@{
     CMPIContext* prepareThread(const ContextEntries& entries);

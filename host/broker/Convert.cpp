@@ -7,7 +7,7 @@
 namespace cimhost {
 namespace {
 
-/** A plain type, with its alternative of Scalar and its member of CMPIValue. */
+/** A type whose values are not pointers, with its alternative of Scalar and its member of CMPIValue. */
 template <class Alternative, class Member>
 struct PlainType {
     CMPIType type;
@@ -35,7 +35,7 @@ constexpr auto plainTypes = std::make_tuple(
     plain<std::int32_t>(CMPI_sint32, &CMPIValue::sint32), plain<std::int64_t>(CMPI_sint64, &CMPIValue::sint64),
     plain<float>(CMPI_real32, &CMPIValue::real32), plain<double>(CMPI_real64, &CMPIValue::real64));
 
-/** Calls the action with each plain type until it returns true. @return whether it did */
+/** Calls the action with each plain type until the action returns true. @return whether it returned true */
 template <class Action>
 bool anyPlainType(Action action) {
     return std::apply([&](const auto&... each) { return (action(each) || ...); }, plainTypes);
@@ -129,7 +129,7 @@ Value singleFrom(const CMPIValue* value, CMPIType type) {
     Value converted{type, false, false, false, scalarFrom(value, type), {}};
     converted.isNull = std::holds_alternative<std::monostate>(converted.single);
     if (converted.isNull || type == CMPI_chars) {
-        converted.type = elementType(type);  // scalarFrom() accepts other values only if they have a valid type.
+        converted.type = elementType(type);  // For other values, scalarFrom() has checked the type.
     }
     return converted;
 }

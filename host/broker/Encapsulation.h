@@ -6,7 +6,7 @@
 
 namespace cimhost {
 
-/** The arena for an object created from another one: that of the current request. */
+/** The arena for an object created from another one: the current request's; outside of requests, the other object's. */
 inline Arena& arenaFor(const Object& source) {
     Arena* ofThread = Broker::arenaOfThread();
     return ofThread == nullptr ? source.arena() : *ofThread;

@@ -8,7 +8,7 @@
 #include "broker/NamedValues.h"
 #include "cim/DateTime.h"
 
-// CMPIBrokerEncFT: creates encapsulated objects; logging, messages and types.
+// CMPIBrokerEncFT: creates and describes encapsulated objects, and logs. getMessage() is in Messages.cpp.
 
 namespace cimhost {
 namespace {
@@ -28,7 +28,7 @@ std::size_t expectedCount(const ClassInfo* classInfo) {
     return usual != 0 ? usual : classInfo->properties.size();
 }
 
-/** The keys of a path that are properties of the class. The provider sets the others next. */
+/** The keys of a path that the class declares; none for an unknown class. The provider sets the other properties. */
 std::vector<NamedValue> initialProperties(const ObjectPath& path, const ClassInfo* classInfo) {
     std::vector<NamedValue> properties;
     properties.reserve(expectedCount(classInfo));
@@ -44,7 +44,7 @@ std::vector<NamedValue> initialProperties(const ObjectPath& path, const ClassInf
     return properties;
 }
 
-/** A new instance of a known class has its keys as properties; that of another class has no properties. */
+/** A new instance of a known class has the keys of its path as properties. An instance of an unknown class has none. */
 CMPIInstance* newInstance(const CMPIBroker* broker, const CMPIObjectPath* path, CMPIStatus* rc) {
     return guarded<CMPIInstance*>(rc, nullptr, [&] {
         Broker& owner = Broker::of(broker);
@@ -129,7 +129,7 @@ CMPIBoolean classPathIsA(const CMPIBroker* broker, const CMPIObjectPath* path, c
     });
 }
 
-/** The object of a handle of any type: all handles begin with the pointer to it. */
+/** The object of a handle of any type: all handles begin with a pointer to their object. */
 const Object& anyObject(const CMPIBroker* broker, const void* handle) {
     Broker::of(broker);
     const void* object = nullptr;
@@ -159,7 +159,7 @@ CMPIString* getType(const CMPIBroker* broker, const void* object, CMPIStatus* rc
         rc, nullptr, [&] { return arenaOf(broker).make<CMPIString>(typeNameOf(anyObject(broker, object).kind())); });
 }
 
-/** Logs a record. @param characters the message; null: the string has it */
+/** Logs a record. @param characters the message; null: the message is in `string` */
 CMPIStatus record(const CMPIBroker* broker, LogRecord record, const char* component, const char* characters,
                   const CMPIString* string) {
     return guarded([&] {

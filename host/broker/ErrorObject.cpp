@@ -43,7 +43,7 @@ CMPIArray* getStrings(const CMPIError* error, CMPIStatus* rc) {
     });
 }
 
-/** Null elements become empty strings. */
+/** Converts an array of strings. Null elements become empty strings. */
 Strings stringsFrom(const CMPIArray* array) {
     if (array == nullptr) {
         return std::nullopt;

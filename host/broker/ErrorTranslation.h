@@ -10,7 +10,7 @@
 #include "broker/Object.h"
 #include "model/Status.h"
 
-// The C boundary: table functions throw Failure; their callers receive a CMPIStatus and a null or zero value.
+// Exceptions at the C boundary. The body of a table function throws Failure; the caller receives a CMPIStatus.
 
 namespace cimhost {
 
@@ -26,13 +26,13 @@ private:
     Status reason;
 };
 
-/** Converts a status. Its message, if it has one, becomes an object of the current request. */
+/** Converts a status. Its message becomes an object of the current request; outside of requests, it is omitted. */
 CMPIStatus toCmpi(const Status& status) noexcept;
 
 /** Converts the current exception to a status. Call it in a catch block. */
 Status statusOfCurrentException() noexcept;
 
-/** Runs the body of a function that returns a status. Exceptions become that status. */
+/** Runs the body of a function that returns a status. Converts an exception to the status. */
 template <class Body>
 CMPIStatus guarded(Body&& body) {
     try {
@@ -45,8 +45,10 @@ CMPIStatus guarded(Body&& body) {
     }
 }
 
-/** Runs the body of a function that returns a value. After an exception, the status is in *rc, and the value is failed.
- *  @param rc may be null */
+/**
+ * Runs the body of a function that returns a value. After an exception, returns `failed`.
+ * @param rc receives the status; can be null
+ */
 template <class Result, class Body>
 Result guarded(CMPIStatus* rc, Result failed, Body&& body) {
     Result result = failed;

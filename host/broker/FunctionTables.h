@@ -27,7 +27,7 @@ struct FunctionTables {
 /** The standard tables, with all functions; valid until the program ends. */
 const FunctionTables& standardTables();
 
-// The single tables; each is defined in the file of its functions.
+// The individual tables; each is defined in the file of its functions.
 
 /** The version of CMPI that the tables implement. */
 constexpr int tableVersion = CMPIVersion200;
@@ -53,8 +53,8 @@ CMPIStatus setPropertyFilterWithKeys(CMPIInstance* instance, const char** proper
 /** @name Messages with arguments
  * Return the default template with $0 to $9 replaced by the arguments. There are no translations.
  *
- * The arguments are count pairs of a CMPIType and a value of type sint32, uint32, sint64, uint64, real64, boolean,
- * chars or string. After an error, the functions return the template without replacements.
+ * The variable arguments are `count` pairs, each a CMPIType and a value. The value has type sint32, uint32, sint64,
+ * uint64, real64, boolean, chars or string. After an error, the functions return the template without replacements.
  */
 ///@{
 CMPIString* getMessage(const CMPIBroker* broker, const char* id, const char* defaultTemplate, CMPIStatus* rc,

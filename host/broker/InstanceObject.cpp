@@ -15,14 +15,14 @@ bool isKey(const InstanceContent& instance, std::string_view name) {
     return property != nullptr ? property->isKey : findNamed(instance.value->path.keys, name) != nullptr;
 }
 
-/** Whether the property filter accepts a property. It usually accepts keys, which identify the instance. */
+/** Whether the property filter accepts a property. Unless it filters keys, it accepts them all. */
 bool accepts(const InstanceContent& instance, std::string_view name) {
     const PropertyList& list = instance.accepted;
     return !list || (!instance.filtersKeys && isKey(instance, name)) ||
            std::any_of(list->begin(), list->end(), [&](const std::string& each) { return cim::sameName(each, name); });
 }
 
-/** The declaration of a property. Providers usually set properties in the order of the class. */
+/** The declaration of a property. Checks the next unset one first, since providers usually follow the class's order. */
 const PropertyInfo& declarationOf(const InstanceContent& target, std::string_view name) {
     const auto& properties = target.classInfo->properties;
     if (target.unset < properties.size() && cim::sameName(properties[target.unset].name, name)) {
@@ -36,7 +36,7 @@ const PropertyInfo& declarationOf(const InstanceContent& target, std::string_vie
     return *property;
 }
 
-/** @throws Failure if the value has another type than the property */
+/** @throws Failure if the type of the value is not that of the property */
 void checkType(const InstanceContent& target, const PropertyInfo& property, const Value& value) {
     const bool isUntypedNull = value.isNull && value.type == CMPI_null;
     if (!isUntypedNull && (value.type != property.type || value.isArray != property.isArray)) {
@@ -45,7 +45,7 @@ void checkType(const InstanceContent& target, const PropertyInfo& property, cons
     }
 }
 
-/** Removes a property that the broker added: the order is that in which the provider sets properties. */
+/** Removes a property that the broker added, since the order is that in which the provider sets properties. */
 void removeInitial(InstanceContent& target, std::vector<NamedValue>& values, std::string_view name) {
     const auto end = values.begin() + static_cast<std::ptrdiff_t>(target.initialCount);
     const auto found =
@@ -56,14 +56,14 @@ void removeInitial(InstanceContent& target, std::vector<NamedValue>& values, std
     }
 }
 
-/** Sets a property of a class that is not known. */
+/** Sets a property of an instance whose class is unknown. */
 void setUnchecked(InstanceContent& target, std::string_view name, Value&& value) {
     if (accepts(target, name)) {
         setNamed(target.value.writable().properties, name, std::move(value));
     }
 }
 
-/** Sets a property as the class declares it. @throws Failure if the class does not */
+/** Sets a property of a known class. @throws Failure if the class does not declare it, or with another type */
 void setDeclared(InstanceContent& target, std::string_view name, Value&& value) {
     const PropertyInfo& property = declarationOf(target, name);
     checkType(target, property, value);

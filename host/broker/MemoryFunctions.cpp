@@ -48,7 +48,7 @@ void MemoryBlocks::free(void* block) {
 namespace {
 
 CMPIGcStat* mark(const CMPIBroker* broker, CMPIStatus* rc) {
-    // CMPI's marks are pointers without const; providers only pass them to release().
+    // CMPI's marks are pointers to non-const, but providers only pass them to release().
     return guarded<CMPIGcStat*>(rc, nullptr,
                                 [&] { return const_cast<CMPIGcStat*>(Broker::of(broker).arena().mark()); });
 }
@@ -93,7 +93,7 @@ void freeObject(const CMPIBroker* broker, Handle* handle) {
     }
 }
 
-/** There is none: queries are not supported. */
+/** Queries are not supported, so there is never a CMPISelectExp. */
 void freeSelectExp(const CMPIBroker*, CMPISelectExp*) {}
 
 }  // namespace

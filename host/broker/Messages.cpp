@@ -18,7 +18,7 @@ public:
     MessageArguments(const MessageArguments&) = delete;
     MessageArguments& operator=(const MessageArguments&) = delete;
 
-    /** Formats the next argument. @throws Failure with CMPI_RC_ERR_TYPE_MISMATCH for other types */
+    /** Formats the next argument. @throws Failure with CMPI_RC_ERR_TYPE_MISMATCH for an unknown type */
     std::string next() {
         switch (va_arg(list, int)) {
             case CMPI_sint32:
@@ -46,7 +46,7 @@ private:
     va_list list;
 };
 
-/** Replaces $0 to $9 by the arguments that exist. */
+/** Replaces $0 to $9 with the arguments that exist. */
 std::string expanded(const std::string& pattern, const std::vector<std::string>& arguments) {
     std::string result;
     for (std::size_t i = 0; i < pattern.size(); ++i) {

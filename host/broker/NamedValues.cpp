@@ -10,8 +10,8 @@ namespace cimhost {
 namespace {
 
 /**
- * The name of a new value at a position. The objects that a thread makes usually have the same names in the same order,
- * so it keeps the first ones, and their copies share the characters.
+ * The name of a new value at a position. The objects that a thread creates usually have the same names in the same
+ * order. For each of the first positions, the thread keeps the last name, and its copies share the characters.
  */
 Name nameAt(std::size_t position, std::string_view name) {
     thread_local std::array<Name, 32> kept;

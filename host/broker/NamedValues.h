@@ -22,7 +22,7 @@ void setNamed(std::vector<NamedValue>& values, std::string_view name, Value&& va
 /** The value of this name as CMPI data. @throws Failure with CMPI_RC_ERR_NO_SUCH_PROPERTY if there is none */
 CMPIData namedData(const std::vector<NamedValue>& values, const char* name, Arena& arena);
 
-/** The value at this position. @param name receives its name; may be null  @throws Failure as namedData() */
+/** The value at this position. @param name receives its name; can be null  @throws Failure as namedData() */
 CMPIData namedDataAt(const std::vector<NamedValue>& values, CMPICount index, CMPIString** name, Arena& arena);
 
 }  // namespace cimhost

@@ -19,17 +19,17 @@ public:
     Object(const Object&) = delete;
     Object& operator=(const Object&) = delete;
 
-    /** The arena that it was created in. */
+    /** The arena that the object was created in. */
     Arena& arena() const { return owner; }
     ObjectKind kind() const { return kindOf; }
 
-    /** Clones are valid until their release: they outlive requests and marks. */
+    /** Whether this is a clone. Clones are valid until their release: they outlive requests and marks. */
     bool isClone = false;
 
-    /** A string object whose character pointer is null, which some object managers pass. */
+    /** Whether this is a string object whose character pointer is null. Some object managers pass such objects. */
     bool lacksCharacters = false;
 
-    /** Set to true when the object is released or destroyed; may be null. */
+    /** Set to true when the object is released or destroyed; can be null. */
     std::shared_ptr<bool> released{};
 
 protected:
@@ -56,7 +56,7 @@ public:
 
     Encapsulated(Arena& itsOwner, const FunctionTables& tables, Content&& initial)
         : Object(itsOwner, Traits<Handle>::kind),
-          // CMPI's handles point to tables without const, but callers do not write to them.
+          // CMPI's handles have pointers to non-const tables, but callers do not write to the tables.
           handle{static_cast<Object*>(this), const_cast<Table*>(&(tables.*Traits<Handle>::table))},
           content(std::move(initial)) {}
 
@@ -80,10 +80,10 @@ Encapsulated<Handle>* objectOf(const Handle* handle) {
     return object->kind() == Traits<Handle>::kind ? static_cast<Encapsulated<Handle>*>(object) : nullptr;
 }
 
-/** Name of the type of these objects, such as "CMPIInstance". */
+/** Name of the type of objects of this kind, such as "CMPIInstance". */
 const char* typeNameOf(ObjectKind kind);
 
-/** Describes an object for people; "CMPIInstance (released)" after its release. */
+/** Describes an object in readable form; after its release, as "CMPIInstance (released)". */
 std::string describe(const Object& object);
 
 }  // namespace cimhost

@@ -19,7 +19,7 @@ namespace cimhost {
 /** The kinds of encapsulated objects. */
 enum class ObjectKind { string, objectPath, instance, dateTime, array, enumeration, args, context, result, error };
 
-/** An instance or a path that can be shared with results, and is copied when it changes after that. */
+/** An instance or a path that can be shared with results. While it is shared, a change copies it first. */
 template <class Kind>
 class Shared {
 public:
@@ -50,10 +50,10 @@ private:
 struct InstanceContent {
     Shared<Instance> value;
     std::shared_ptr<const ClassInfo> classInfo{};  ///< null if the class is unknown
-    PropertyList accepted{};                       ///< the property filter; none accepts every property
+    PropertyList accepted{};                       ///< the property filter; std::nullopt accepts every property
     bool filtersKeys = false;                      ///< whether the filter also applies to keys
     std::size_t initialCount = 0;                  ///< number of properties, all at the front, that the broker added
-    std::size_t unset = 0;  ///< position in the class from which on no property has been set; unused without class
+    std::size_t unset = 0;  ///< position in the class; no property from there on is set; unused if the class is unknown
 };
 
 /** Content of a CMPIArray: elements of one type. */
@@ -62,15 +62,15 @@ struct ArrayContent {
     std::vector<Scalar> elements{};
 };
 
-/** Content of a CMPIEnumeration: the elements, and the number of those that getNext returned. */
+/** Content of a CMPIEnumeration: the elements, and the number of elements that getNext has returned. */
 struct EnumerationContent : ArrayContent {
     std::size_t position = 0;
 };
 
-/** Calls that a result rejects with an error. They do not become events. */
+/** Special rules of a result. A call that it refuses fails and does not become an event. */
 struct ResultRules {
     bool refusesInstances = false;
-    bool refusesToBeEmpty = false;  ///< returnDone before any result
+    bool refusesToBeEmpty = false;  ///< refuses returnDone before any result
     bool keepsPaths = false;        ///< the provider must not release the paths that it returned
 };
 
@@ -78,7 +78,7 @@ struct ResultRules {
 struct ResultContent {
     ResultEvents* events = nullptr;
     ResultRules rules{};
-    std::shared_ptr<bool> pathReleased{};  ///< whether such a path was released; null: none was returned
+    std::shared_ptr<bool> pathReleased{};  ///< whether a path that it keeps was released; null: it keeps none
 };
 
 /** The content, kind and function table of a handle type. */

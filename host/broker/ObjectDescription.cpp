@@ -13,7 +13,7 @@ std::string describe(const std::vector<NamedValue>& values) {
     return all;
 }
 
-// One function per content; an enumeration is described as an array.
+// One function per type of content; an enumeration is described as an array.
 
 std::string describe(const std::string& string) {
     return string;
@@ -50,12 +50,12 @@ std::string describeHandle(const Object& object) {
                                 : std::string(typeNameOf(object.kind())) + " (released)";
 }
 
-/** The kinds, in the order of ObjectKind. */
 struct Kind {
     const char* name;
     std::string (*describe)(const Object& object);
 };
 
+/** The kinds, in the order of ObjectKind. */
 constexpr Kind kinds[] = {
     {"CMPIString", describeHandle<CMPIString>},     {"CMPIObjectPath", describeHandle<CMPIObjectPath>},
     {"CMPIInstance", describeHandle<CMPIInstance>}, {"CMPIDateTime", describeHandle<CMPIDateTime>},

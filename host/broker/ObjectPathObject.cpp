@@ -39,8 +39,8 @@ CMPIStatus addKey(CMPIObjectPath* path, const char* name, const CMPIValue* value
 }
 
 /**
- * Returns what `read` finds among the keys, in the state of a key. The status of a null key, which some object managers
- * pass to providers, is CMPI_RC_ERR_NOT_FOUND.
+ * Returns the data that `read` finds among the keys, marked as a key. The status is CMPI_RC_ERR_NOT_FOUND for a null
+ * key, which some object managers pass to providers.
  */
 template <class Read>
 CMPIData keyData(const CMPIObjectPath* path, CMPIStatus* rc, Read read) {
@@ -68,7 +68,7 @@ CMPICount getKeyCount(const CMPIObjectPath* path, CMPIStatus* rc) {
     return guarded<CMPICount>(rc, 0, [&] { return static_cast<CMPICount>(content(path)->keys.size()); });
 }
 
-/** Copies the namespace and the class of a path. @return the content of the target */
+/** Copies the namespace and the class name of a path. @return the content of the target */
 ObjectPath& copyClass(CMPIObjectPath* path, const CMPIObjectPath* source) {
     ObjectPath& target = content(path).writable();
     const ObjectPath& from = argument(source);

@@ -24,7 +24,7 @@ void noticeRelease(ResultContent& result, const CMPIObjectPath* path) {
     objectOf(path)->released = result.pathReleased;
 }
 
-/** The events of a result belong to its request and must not outlive it. */
+/** Fails: the events of a result belong to its request, which a clone can outlive. */
 CMPIResult* cloneResult(const CMPIResult* result, CMPIStatus* rc) {
     return guarded<CMPIResult*>(rc, nullptr, [&]() -> CMPIResult* {
         self(result);

@@ -3,7 +3,7 @@
 #include "broker/ErrorTranslation.h"
 #include "broker/FunctionTables.h"
 
-// CMPIBrokerFT: requests of providers to the object manager. Each function passes a Request to UpCalls.
+// CMPIBrokerFT: attaches threads, and passes the requests of providers to UpCalls.
 
 namespace cimhost {
 namespace {

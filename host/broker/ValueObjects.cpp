@@ -20,7 +20,7 @@ const char* getCharPtr(const CMPIString* string, CMPIStatus* rc) {
 
 // CMPIDateTime.
 
-/** A time before 1970 is returned as the two's complement of a negative number. */
+/** A time before 1970 is returned as a negative number in two's complement. */
 CMPIUint64 getBinaryFormat(const CMPIDateTime* time, CMPIStatus* rc) {
     return guarded<CMPIUint64>(rc, 0, [&] {
         const std::optional<std::int64_t> binary = microsecondsOf(content(time).value);
@@ -99,7 +99,7 @@ CMPIBoolean hasNext(const CMPIEnumeration* enumeration, CMPIStatus* rc) {
     });
 }
 
-/** Returns all elements, also those that getNext returned, and does not change the position. */
+/** Returns all elements, including those that getNext has returned. Does not change the position. */
 CMPIArray* toArray(const CMPIEnumeration* enumeration, CMPIStatus* rc) {
     return guarded<CMPIArray*>(rc, nullptr, [&] {
         const auto& object = self(enumeration);

@@ -9,7 +9,7 @@
 
 namespace cimhost {
 
-/** The CIM operations: those that this host sends to providers, then those that only a provider's up-call can name. */
+/** The CIM operations. Those after referenceNames occur only in up-calls: this host does not send them to providers. */
 enum class Operation {
     enumerateInstances,
     enumerateInstanceNames,
@@ -39,15 +39,15 @@ bool isReferenceOperation(Operation operation);
 /** Whether the results of an operation are object paths, not instances. */
 bool returnsPaths(Operation operation);
 
-/** Names of requested properties; none: all properties; an empty list: no property. */
+/** Names of requested properties; std::nullopt requests all properties, an empty list none. */
 using PropertyList = std::optional<std::vector<std::string>>;
 
 /** The entries of a request's context, such as CMPIInvocationFlags and CMPIPrincipal. */
 using ContextEntries = std::vector<NamedValue>;
 
-/** Names that restrict the results of an association operation; none if the client did not send one. */
+/** Names that restrict the results of an association operation. A name without a value does not restrict them. */
 struct AssociationFilter {
-    std::optional<std::string> associationClass{};  ///< not for references, whose result class is the association
+    std::optional<std::string> associationClass{};  ///< not for references: their result class is the association
     std::optional<std::string> resultClass{};
     std::optional<std::string> role{};
     std::optional<std::string> resultRole{};  ///< not for references
@@ -61,8 +61,8 @@ struct Request {
     Instance instance{};         ///< of createInstance and modifyInstance
     AssociationFilter filter{};  ///< of the association operations
     ContextEntries context{};
-    std::string language{};  ///< of execQuery, as query
-    std::string query{};
+    std::string language{};           ///< of execQuery
+    std::string query{};              ///< of execQuery
     std::string member{};             ///< the method of invokeMethod; the property of setProperty and getProperty
     Value value{};                    ///< of setProperty
     std::vector<NamedValue> input{};  ///< parameters of invokeMethod
@@ -122,7 +122,7 @@ struct Request {
     }
     ///@}
 
-    /** Returns the same request with this context. */
+    /** Returns a copy of the request with this context. */
     Request with(ContextEntries entries) const;
 };
 

@@ -14,10 +14,10 @@ namespace cimhost {
 /** The status and the results that one provider returned for a request. */
 struct ProviderResponse {
     Status status{};            ///< as the provider returned it; CMPI_RC_ERR_FAILED if it threw an exception
-    bool hasMessage = false;    ///< whether the status carried a message, even an empty one
+    bool hasMessage = false;    ///< whether the status had a message, even an empty one
     bool threw = false;         ///< whether the provider threw an exception
     bool releasedPath = false;  ///< whether the provider released a path that the result keeps
-    ResultEvents events{};      ///< the results, in order, also those before a failure
+    ResultEvents events{};      ///< the results, in order, including those before a failure
     std::string crashReason{};  ///< a sentence if the provider's process would have crashed, otherwise empty
 
     int doneCount() const { return cimhost::doneCount(events); }
@@ -25,7 +25,7 @@ struct ProviderResponse {
 
 /** The response that a client receives, and those of the providers that were called for it. */
 struct Response {
-    Status status{};                            ///< OK, or a code with a message; then the results are empty
+    Status status{};                            ///< OK, or another code with a message and without results
     std::vector<Instance> instances{};          ///< results that are instances; one for getInstance
     std::vector<ObjectPath> paths{};            ///< results that are paths; one for createInstance
     Value value{};                              ///< result of invokeMethod or getProperty
@@ -41,7 +41,7 @@ struct Response {
 
     bool ok() const { return status.ok(); }
 
-    /** The first result; an empty one if there is none. */
+    /** The first instance or path; an empty one if there is none. */
     Instance instance() const { return instances.empty() ? Instance{} : instances.front(); }
     ObjectPath path() const { return paths.empty() ? ObjectPath{} : paths.front(); }
 

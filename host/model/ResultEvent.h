@@ -33,20 +33,20 @@ struct ErrorInfo {
     std::optional<std::vector<std::string>> messageArguments{};
 };
 
-/** A call of returnDone. */
+/** A call to returnDone. */
 struct Done {};
 
 /** A null pointer that a provider returned as an instance, an object path or an error. The result rejects it. */
 struct NullResult {};
 
 /**
- * One call of a result function: an instance, an object path, data, an error or null was returned, or returnDone. An
- * instance or a path that only the event refers to may be changed.
+ * One call to a result function: the instance, object path, data, error or null pointer that the provider returned, or
+ * Done. The owner of an event can change its instance or path if nothing else refers to it.
  */
 using ResultEvent = std::variant<std::shared_ptr<Instance>, std::shared_ptr<ObjectPath>, Value,
                                  std::shared_ptr<const ErrorInfo>, NullResult, Done>;
 
-/** The results of a provider, in order, as they were at the time of the call. */
+/** The results of a provider, in the order of its calls, each as it was at the time of the call. */
 using ResultEvents = std::vector<ResultEvent>;
 
 /** The alternative of ResultEvent for a result of this kind. */
@@ -67,7 +67,7 @@ struct AlternativeFor<ErrorInfo> {
     using Type = std::shared_ptr<const ErrorInfo>;
 };
 
-/** The result of an event; null if it is of another kind. */
+/** The result of an event; null if the event is of another kind. */
 template <class Kind>
 const Kind* resultOf(const ResultEvent& event) {
     const auto* alternative = std::get_if<typename AlternativeFor<Kind>::Type>(&event);
@@ -90,7 +90,7 @@ std::vector<Kind> eventsOf(const ResultEvents& events) {
     return found;
 }
 
-/** Number of calls of returnDone. */
+/** Number of calls to returnDone. */
 inline int doneCount(const ResultEvents& events) {
     return static_cast<int>(std::count_if(
         events.begin(), events.end(), [](const ResultEvent& event) { return std::holds_alternative<Done>(event); }));

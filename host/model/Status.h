@@ -6,7 +6,7 @@
 
 namespace cimhost {
 
-/** A CIM status code with an optional message. The code is an int: a provider can return one that is not a CMPIrc. */
+/** A CIM status code with an optional message. It is an int: a provider can return a number that is not a CMPIrc. */
 struct Status {
     int rc = CMPI_RC_OK;
     std::string message{};

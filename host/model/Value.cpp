@@ -12,7 +12,7 @@
 namespace cimhost {
 namespace {
 
-/** By the index of the alternative in Scalar. */
+/** The CMPI types of the alternatives of Scalar, in the order of the alternatives. */
 constexpr CMPIType types[] = {CMPI_null,   CMPI_boolean, CMPI_char16,   CMPI_uint8,  CMPI_uint16,  CMPI_uint32,
                               CMPI_uint64, CMPI_sint8,   CMPI_sint16,   CMPI_sint32, CMPI_sint64,  CMPI_real32,
                               CMPI_real64, CMPI_string,  CMPI_dateTime, CMPI_ref,    CMPI_instance};
@@ -92,7 +92,7 @@ Name Name::declared(const std::string& name) {
     static auto& names = *new std::set<std::string>;  // never destroyed: names may be used until the process ends
     const std::lock_guard<std::mutex> lock(mutex);
     Name result;
-    result.shared = {std::shared_ptr<void>(), &*names.insert(name).first};  // without an owner that is counted
+    result.shared = {std::shared_ptr<void>(), &*names.insert(name).first};  // not reference-counted: the set owns it
     return result;
 }
 

@@ -19,7 +19,7 @@ namespace cimhost {
 struct ObjectPath;
 struct Instance;
 
-/** A CIM datetime: a point in time or an interval, as the standard's 25 characters. */
+/** A CIM datetime: a point in time or an interval, in the standard's format of 25 characters. */
 struct DateTime {
     std::string value;
 };
@@ -41,13 +41,13 @@ using Scalar = std::variant<std::monostate, bool, Char16, std::uint8_t, std::uin
 /** The CIM type of a Scalar's alternative, such as CMPI_uint32 for std::uint32_t; CMPI_null for std::monostate. */
 CMPIType typeOf(const Scalar& scalar);
 
-/** Name of a CIM type in MOF, without array brackets; "reference" or "instance" for these. */
+/** Name of a CIM type in MOF, without array brackets. Other types are "reference", "instance", "null" or "unknown". */
 std::string_view typeName(CMPIType type);
 
-/** The intrinsic type of this name in MOF, which ignores letter case; none for other names. */
+/** The intrinsic type with this name in MOF, regardless of letter case; none if there is no such type. */
 std::optional<CMPIType> intrinsicType(std::string_view name);
 
-/** Whether the type is one of the eight integer types, or an array of them. */
+/** Whether the type is one of the eight integer types, or an array of one. */
 inline bool isInteger(CMPIType type) {
     return (type & CMPI_INTEGER) != 0 && (type & CMPI_ENC) == 0;
 }
@@ -65,7 +65,7 @@ struct ScalarRange {
     const Scalar& operator[](std::size_t index) const { return first[index]; }
 };
 
-/** The elements of an array, allocated separately: most values are not arrays, and must be small. */
+/** The elements of an array. They are allocated separately, so that the values that are not arrays are small. */
 class ArrayElements {
 public:
     ArrayElements() = default;
@@ -86,22 +86,22 @@ public:
     }
 
 private:
-    std::unique_ptr<std::vector<Scalar>> elements{};  ///< null: none
+    std::unique_ptr<std::vector<Scalar>> elements{};  ///< null if there are no elements
 };
 
-/** A CIM value, also null, with its declared type. */
+/** A CIM value, which can be null, with its declared type. */
 struct Value {
     CMPIType type = CMPI_null;     ///< element type, without CMPI_ARRAY
     bool isArray = false;          ///< whether it is an array of that type
     bool isNull = true;            ///< whether the value, or the array, is null
-    bool lacksCharacters = false;  ///< a string object whose character pointer is null
-    Scalar single{};               ///< the value unless an array; std::monostate when null
-    ArrayElements items{};         ///< the elements of an array; none when null
+    bool lacksCharacters = false;  ///< whether it is a string object whose character pointer is null
+    Scalar single{};               ///< the value, unless it is an array; std::monostate if null
+    ArrayElements items{};         ///< the elements of an array; none if null
 
-    /** The elements of an array, or the single value; none when null. */
+    /** The elements of an array, or the single value; none if null. */
     ScalarRange elements() const { return isArray ? items : ScalarRange{&single, isNull ? 0U : 1U}; }
 
-    /** A single value of the scalar's own type. */
+    /** A single value of the scalar's type. */
     static Value of(Scalar scalar);
     template <std::size_t size>
     static Value of(const char (&characters)[size]) {
@@ -126,7 +126,7 @@ struct Value {
 
 /**
  * The name of a key, a property or a parameter, with the letter case that its author used. Copies share its characters.
- * Most names are those that classes declare: these are stored once in the process, and never counted or freed.
+ * Most names are declared by classes. Such a name is stored once per process, and neither reference-counted nor freed.
  */
 class Name {
 public:
@@ -134,7 +134,7 @@ public:
     Name(std::string itsName) : shared(std::make_shared<const std::string>(std::move(itsName))) {}
     Name(const char* itsName) : Name(std::string(itsName)) {}
 
-    /** The same name as one that the process keeps. Only for names of classes, since it never frees them. */
+    /** Returns a name that is stored until the process ends. Use it only for names that classes declare. */
     static Name declared(const std::string& name);
 
     const std::string& string() const {
@@ -162,7 +162,7 @@ private:
     std::shared_ptr<const std::string> shared{};  ///< null: empty
 };
 
-/** A named value: a key of an object path or a property of an instance. */
+/** A named value: a key, a property, a parameter or a context entry. */
 struct NamedValue {
     NamedValue() = default;
     NamedValue(Name itsName, Value&& itsValue) : name(std::move(itsName)), value(std::move(itsValue)) {}
@@ -172,7 +172,7 @@ struct NamedValue {
     Value value{};
 };
 
-/** Identity of a CIM instance, or of a class when it has no keys. */
+/** Identity of a CIM instance; without keys, identity of a class. */
 struct ObjectPath {
     std::string host{};  ///< empty: the local host
     std::string nameSpace{};

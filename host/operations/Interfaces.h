@@ -11,14 +11,14 @@
 #include "operations/LoadedLibrary.h"
 #include "operations/ManagerBehaviour.h"
 
-// Calls of providers' functions: factories, which create management interfaces, and their cleanup.
+// Calls to providers: to the factories of management interfaces, and to the cleanup functions of the interfaces.
 
 namespace cimhost {
 
-/** The result of a call of a provider's function. */
+/** The result of a call to a provider's function. */
 struct ProviderCall {
     Status status{};
-    bool hasMessage = false;  ///< whether the status carried a message, even an empty one
+    bool hasMessage = false;  ///< whether the status had a message, even an empty one
     bool threw = false;       ///< whether the provider threw an exception; the status then describes it
 };
 
@@ -63,7 +63,7 @@ Interface* createInterface(const LoadedLibrary& library, const std::string& prov
 
 /**
  * Calls the cleanup function of an interface.
- * @param terminating false: the provider may ask to stay loaded
+ * @param terminating whether the object manager is stopping
  * @return the provider's status code; CMPI_RC_ERR_FAILED if it throws, CMPI_RC_OK if it has no cleanup function
  */
 template <class Interface>

@@ -9,7 +9,7 @@
 
 namespace cimhost {
 
-/** A provider's library is missing or cannot be loaded, or its factory is missing or fails. */
+/** A provider cannot be started: for example, its library cannot be loaded, or its factory is missing or fails. */
 class LibraryError : public std::runtime_error {
 public:
     using std::runtime_error::runtime_error;
@@ -30,20 +30,20 @@ public:
 /** The directories to search for libraries, and the flags to load them with. */
 struct LibraryOptions {
     std::vector<std::filesystem::path> searchPath{};  ///< searched in order; empty: the system's directories
-    int flags = RTLD_NOW | RTLD_GLOBAL;               ///< of dlopen; other object managers use these
+    int flags = RTLD_NOW | RTLD_GLOBAL;               ///< for dlopen; the default is that of other object managers
 };
 
 /**
  * Finds the file of a provider library.
  * @param location "Name" for libName.so in one of the directories; a name with a slash is a file name
- * @throws LibraryNotFound if no directory contains it; the message names all of them
+ * @throws LibraryNotFound if no directory contains it; the message names all directories
  */
 std::filesystem::path findLibrary(const std::string& location, const LibraryOptions& options);
 
 /** A shared library in this process. The destructor closes it unless keep() was called. */
 class LoadedLibrary {
 public:
-    /** @throws LibraryNotLoaded with the reason of dlopen */
+    /** @throws LibraryNotLoaded with the error message of dlopen */
     LoadedLibrary(std::filesystem::path itsFile, int flags);
     ~LoadedLibrary();
     LoadedLibrary(const LoadedLibrary&) = delete;
@@ -57,7 +57,7 @@ public:
 
     const std::filesystem::path& file() const { return libraryFile; }
 
-    /** Keeps the library in the process until it ends. */
+    /** Keeps the library loaded until the process ends. */
     void keep() { staysLoaded = true; }
 
 private:

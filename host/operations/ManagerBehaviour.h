@@ -19,19 +19,19 @@ enum class FactoryChoice {
     neither  ///< the library is rejected
 };
 
-/** Options for loading libraries and for the calls of factories and cleanup. */
+/** Options for loading libraries and for calls to factories and cleanup functions. */
 struct ProviderPolicy {
     FactoryChoice factory = FactoryChoice::named;
     bool bindsLazily = false;             ///< functions of a library are resolved at their first call
     bool startsAllInterfaces = false;     ///< the instance and association interfaces of a class are created together
-    bool startsProviderPerClass = false;  ///< factories are called once per requested class, not per provider
-    bool startsConcurrently = false;      ///< factories of different providers may run concurrently
-    bool staysOnlyIfAllAsk = false;       ///< an idle library stays only if all its interfaces ask for it
+    bool startsProviderPerClass = false;  ///< factories are called once per requested class, not once per provider
+    bool startsConcurrently = false;      ///< factories of different providers can run concurrently
+    bool staysOnlyIfAllAsk = false;       ///< an idle library stays only if all its interfaces ask to stay
 };
 
 /**
- * The points at which CMPI object managers differ. This class behaves as the standard says; a subclass emulates another
- * object manager. Called concurrently.
+ * The behaviour in which CMPI object managers differ. This class behaves as the standard says; a subclass emulates
+ * another object manager. The functions are called concurrently.
  */
 class ManagerBehaviour {
 public:
@@ -65,8 +65,7 @@ public:
     /** Whether an association operation calls a provider once per association class, and passes the class. */
     virtual bool namesAssociationClass() const { return true; }
 
-    /** Checks the types of the properties that a client sent, and may convert them. @return not OK: reject the request
-     */
+    /** Checks, and can convert, the types of the properties that a client sent. @return not OK: reject the request */
     virtual Status coerceTypes(Request& /*request*/, const Broker& /*broker*/) const { return {}; }
 
     /** Changes a request into the form that the manager passes to providers. */
@@ -80,13 +79,13 @@ public:
 
     /** @name Responses */
     ///@{
-    /** A sentence on the cause if the response would have crashed the provider's process, otherwise empty. */
+    /** A sentence with the cause if the response would have crashed the provider's process, otherwise empty. */
     virtual std::string crashReason(const ProviderResponse& /*response*/, Operation /*operation*/) const { return {}; }
 
     /** The status that the client receives for a provider's response: OK, or a code with a message. */
     virtual Status statusOf(const ProviderResponse& response, Operation operation) const;
 
-    /** The path of a created instance: the first returned path, or the path of the first returned instance. */
+    /** The path of a created instance: that of the first result that is a path or an instance. */
     virtual StatusOr<ObjectPath> createdPath(const ProviderResponse& response) const;
     ///@}
 };

@@ -30,7 +30,7 @@ auto associationClassOf(Operation operation) {
     return isReferenceOperation(operation) ? &AssociationFilter::resultClass : &AssociationFilter::associationClass;
 }
 
-/** Returns the instance of a creation: the keys that are only in the path, then the properties. */
+/** Returns the instance to create: the keys that are only in the path, then the properties. */
 Instance withKeys(const ObjectPath& path, const Instance& instance) {
     Instance complete{path, {}};
     for (const NamedValue& key : path.keys) {
@@ -42,7 +42,7 @@ Instance withKeys(const ObjectPath& path, const Instance& instance) {
     return complete;
 }
 
-/** Removes the classes of providers that an earlier class has, too. */
+/** Removes each class whose provider also serves an earlier class of the list. */
 void removeSameProviders(std::vector<const ServedClass*>& classes) {
     std::vector<const ServedClass*> unique;
     std::copy_if(classes.begin(), classes.end(), std::back_inserter(unique), [&](const ServedClass* each) {

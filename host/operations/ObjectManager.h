@@ -19,13 +19,14 @@ struct ObjectManagerOptions {
     std::function<void(const LogRecord&)> log{};          ///< none: log records are discarded
     ContextEntries context{};                             ///< entries of every request's context, such as CMPIPrincipal
     std::shared_ptr<const ManagerBehaviour> behaviour{};  ///< null: the standard behaviour
-    bool keepsEvents = true;  ///< whether Response::providers contains the events, which a large response copies
+    bool keepsEvents = true;  ///< whether Response::providers contains the events; this copies the results
 };
 
 /**
  * The embedded object manager. It calls the provider that is registered for a request, and maps the provider's response
- * to the client's. Clients and providers (UpCalls) use the same function. A request runs on the calling thread unless
- * the behaviour uses another. Requests may run concurrently; a lock is held only while a factory runs.
+ * to the client's. Clients and providers (UpCalls) call the same function, perform(). A request runs on the calling
+ * thread unless the behaviour uses another. Requests can run concurrently: a lock is held while a factory runs, but not
+ * while a provider performs a request.
  *
  * If a response would have crashed the provider's process (ManagerBehaviour::crashReason), the library is unloaded
  * without cleanup as soon as no request is running. The provider then loses its state in memory.
@@ -39,23 +40,23 @@ public:
     ObjectManager(ObjectManagerOptions itsOptions, ProviderRegistry itsRegistry);
 
     /**
-     * Performs a request. The provider receives the instance of a creation or modification with exactly its properties.
-     * For a creation, the keys of the path that are not among the properties precede them.
+     * Performs a request. The provider receives the instance of a creation or modification with exactly the properties
+     * of the request. In a creation, the keys of the path that are not among the properties precede them.
      *
      * An association operation calls the providers of the association class (for references, the result class) and of
-     * its registered subclasses; without a class, those of all registered association classes. Each receives the class
-     * that it is called for.
+     * its registered subclasses; without a class, those of all registered association classes. Each call passes the
+     * class that it is made for, unless the behaviour omits the class.
      *
-     * @return the results, or a status that is not OK, with a message: that of mapResponses();
+     * @return the results, or a message and a status other than OK: the status from mapResponses();
      * CMPI_RC_ERR_INVALID_NAMESPACE or CMPI_RC_ERR_INVALID_CLASS if no provider is registered;
-     * CMPI_RC_ERR_NOT_SUPPORTED for methods and single properties
-     * @throws LibraryError if a provider cannot be loaded, unless the behaviour has a status for it
+     * CMPI_RC_ERR_NOT_SUPPORTED for methods and single properties; CMPI_RC_ERR_FAILED after stop()
+     * @throws LibraryError if a provider cannot be started, unless the behaviour has a status for the error
      */
     Response perform(Request request) override;
 
     /**
-     * Cleans up all providers and unloads the libraries that do not ask to stay, as an idle object manager does. The
-     * next request loads them again. Must not be called while a request is running.
+     * Cleans up all providers, and unloads the libraries whose providers do not ask to stay, as an idle object manager
+     * does. The next request loads them again. Must not be called while a request is running.
      */
     void idle() { pool.idle(); }
 

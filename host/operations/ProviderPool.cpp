@@ -14,7 +14,7 @@ bool asksToStay(int rc) {
     return rc == CMPI_RC_DO_NOT_UNLOAD || rc == CMPI_RC_NEVER_UNLOAD;
 }
 
-/** Marks a provider as starting, for its lifetime. */
+/** Marks a provider as starting while this object exists. */
 class Starting {
 public:
     explicit Starting(bool& itsFlag) : flag(itsFlag) { flag = true; }
@@ -102,7 +102,7 @@ void ProviderPool::unloadCrashed() {
     }
 }
 
-/** Holds no mutex during a cleanup, which may wait for requests that need one. */
+/** Holds no mutex during a cleanup, which can wait for requests that need one. */
 void ProviderPool::stop() {
     const InUse use(*this);
     if (stopped.exchange(true)) {

@@ -20,9 +20,9 @@ namespace cimhost {
 constexpr const char* stoppingMessage = "The object manager is stopping.";
 
 /**
- * The providers in this process. The first request for a provider loads its library and calls its factory, once per
- * interface; after a failure, the next request tries again. stop() cleans up all interfaces. The destructor closes the
- * libraries, except those whose cleanup asks to stay. Safe to use from several threads and from inside requests.
+ * The providers in this process. The first request for an interface of a provider loads the library, if necessary, and
+ * calls the factory; after a failure, the next request tries again. stop() cleans up all interfaces. The destructor
+ * also closes the libraries, except those whose providers ask to stay. Safe to use concurrently and during requests.
  */
 class ProviderPool {
 public:
@@ -32,7 +32,7 @@ public:
     ProviderPool(const ProviderPool&) = delete;
     ProviderPool& operator=(const ProviderPool&) = delete;
 
-    /** Marks the pool as used by a request, for its lifetime. Requests may be nested. */
+    /** Marks the pool as used by a request while this object exists. Requests can be nested. */
     class InUse {
     public:
         explicit InUse(ProviderPool& itsPool) : pool(itsPool) { ++pool.uses; }
@@ -62,13 +62,13 @@ public:
     bool isStopped() const { return stopped; }
 
 private:
-    /** A provider and the interfaces that were created. */
+    /** A provider and its interfaces, which are null until their creation. */
     struct Provider {
         LoadedLibrary* library = nullptr;
         CMPIInstanceMI* instance = nullptr;
         CMPIAssociationMI* association = nullptr;
         bool isStarting = false;  ///< a factory is running
-        ChainMutex mutex{};       ///< held while a factory runs, if factories may run concurrently
+        ChainMutex mutex{};       ///< held while a factory runs, if factories can run concurrently
     };
 
     template <class Interface>
@@ -76,7 +76,7 @@ private:
 
     using Libraries = std::map<std::string, std::unique_ptr<LoadedLibrary>>;  ///< by location
 
-    /** Cleans up an interface that is not null, and keeps the library if it asks for that. */
+    /** Cleans up an interface, unless it is null. Keeps the library if the interface asks to stay. */
     template <class Interface>
     void end(LoadedLibrary* library, Interface* interface);
 
@@ -97,7 +97,7 @@ private:
     Broker& broker;
     LibraryOptions options;
     ProviderPolicy policy;
-    ChainMutex mutex;  ///< held while a factory runs, which may send a request to another provider
+    ChainMutex mutex;  ///< held while a factory runs, unless Provider::mutex is held instead
     Libraries libraries;
     std::map<ProviderAddress, Provider> providers;
     std::atomic<std::size_t> uses{0};

@@ -10,11 +10,11 @@
 
 namespace cimhost {
 
-/** The library of a provider, and its name there. */
+/** The library of a provider, and the provider's name in it. */
 struct ProviderAddress {
     std::string location{};  ///< see findLibrary()
     std::string provider{};  ///< prefix of its factories
-    std::string forClass{};  ///< the class that it is created for; empty: all classes that it serves
+    std::string forClass{};  ///< the class that the provider is created for; empty: all its classes
 
     bool operator<(const ProviderAddress& other) const {
         return std::tie(location, provider, forClass) < std::tie(other.location, other.provider, other.forClass);
@@ -38,7 +38,7 @@ public:
     ProviderRegistry() = default;
     explicit ProviderRegistry(const std::vector<ProviderRegistration>& registrations);
 
-    /** Adds a registration, or replaces that for the same namespace, class and kind. */
+    /** Adds a registration. Replaces entries for the same namespace, class and kind. */
     void add(const ProviderRegistration& registration);
 
     /** All namespaces that registrations name, each once, in the order of the registrations. */

@@ -10,10 +10,10 @@
 namespace cimhost {
 
 /**
- * Sends one request to a management interface. Objects that the provider creates through the broker are released at the
- * end of the request. The status is CMPI_RC_ERR_NOT_SUPPORTED if the provider lacks the function. Requests may be
- * nested.
- * @throws std::invalid_argument if the operation belongs to the other kind of interface
+ * Sends one request to a management interface. Objects that the provider creates through the broker, except clones, are
+ * freed at the end of the request. The status is CMPI_RC_ERR_NOT_SUPPORTED if the provider lacks the function. Requests
+ * can be nested.
+ * @throws std::invalid_argument if this kind of interface does not have the operation
  */
 ProviderResponse runRequest(Broker& broker, CMPIInstanceMI* interface, Request request,
                             const ManagerBehaviour& behaviour = ManagerBehaviour::standard());

@@ -28,25 +28,25 @@ constexpr const char* kindName = "instance";
 template <>
 constexpr const char* kindName<ObjectPath> = "object path";
 
-/** Whether an event is of this kind or of one that every operation may have. */
+/** Whether an event is of this kind, or of one that every operation permits. */
 template <class Kind>
 bool isExpected(const ResultEvent& event) {
     return resultOf<Kind>(event) != nullptr || std::holds_alternative<Done>(event) ||
            resultOf<ErrorInfo>(event) != nullptr || std::holds_alternative<NullResult>(event);
 }
 
-/** Appends the result of an event, which it leaves unless it is kept or shared. */
+/** Appends the result of an event. Copies it if events are kept or the result is shared, otherwise moves it. */
 template <class Kind>
 void appendResult(std::vector<Kind>& results, std::shared_ptr<Kind>& result, bool keeps) {
     if (keeps || result.use_count() > 1) {
         results.push_back(*result);
     } else {
         results.push_back(std::move(*result));
-        result.reset();  // while the processor has it in its caches
+        result.reset();  // free it while it is in the processor's caches
     }
 }
 
-/** Appends all results of this kind; an error if there are others. They leave the events, unless these are kept. */
+/** Appends all results of this kind, which are moved unless events are kept. Fails if there are other results. */
 template <class Kind>
 Status collect(std::vector<ProviderResponse>& responses, Operation operation, bool keepsEvents,
                std::vector<Kind>& results) {

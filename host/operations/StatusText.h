@@ -6,7 +6,7 @@
 
 namespace cimhost {
 
-/** Name of a CMPI status code, such as CMPI_RC_ERR_NOT_FOUND; "unknown code" for a number that has none. */
+/** Name of a CMPI status code, such as CMPI_RC_ERR_NOT_FOUND; "unknown code" for a number without a name. */
 std::string codeName(int code);
 
 /** The status on one line: "error 6 (CMPI_RC_ERR_NOT_FOUND)", followed by a colon and the message if it has one. */

@@ -4,13 +4,13 @@
 
 namespace cimhost {
 
-/** A file cannot be read or has an error. The message begins with the file's name, line and column. */
+/** A file is missing, cannot be read or has an error. The message names the line and column only if they are known. */
 class LoadError : public std::runtime_error {
 public:
     using std::runtime_error::runtime_error;
 };
 
-/** A value does not have the required type. The message contains the value, the type, and the valid values. */
+/** A value is malformed or does not have the required type. */
 class ValueError : public std::runtime_error {
 public:
     using std::runtime_error::runtime_error;

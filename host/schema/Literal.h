@@ -24,7 +24,7 @@ struct Literal {
 };
 
 /**
- * Converts a literal to a type other than a reference or an instance; std::monostate for NULL.
+ * Converts a literal to a type that is neither a reference nor an instance. NULL becomes std::monostate.
  * @throws ValueError if the literal is of another kind or out of range
  */
 Scalar typedScalar(const Literal& literal, CMPIType type);
@@ -32,20 +32,20 @@ Scalar typedScalar(const Literal& literal, CMPIType type);
 /**
  * Converts a literal to an element of a property's value. The literal of a reference is a string with its path.
  *
- * @param defaultNameSpace of a reference without a namespace
- * @throws ValueError, PathError if it does not match the property's type or the class of the reference
+ * @param defaultNameSpace the namespace of a reference that does not name one
+ * @throws ValueError, PathError if the literal does not match the property's type or the class of the reference
  */
 Scalar typedElement(const Literal& literal, const Property& property, const Schema& schema,
                     const std::string& defaultNameSpace);
 
-/** The type of a literal that no class declares: string, boolean, uint64 or (negative) sint64, real64, char16. */
+/** The type of a literal without a declared type: string, boolean, uint64 (sint64 if negative), real64, char16. */
 CMPIType literalType(const Literal& literal);
 
 /**
- * Reads a property value from a command line: without quotation marks for strings, datetimes, references and char16; as
- * a literal for other types; as a list in braces, {"a", "b"}, for arrays. Nothing is the empty string and not valid for
- * other types; null cannot be written.
- * @throws ValueError, PathError with the property's name
+ * Reads a property value from a command line. Strings, datetimes, references and char16 have no quotation marks,
+ * values of other types are literals, and arrays are lists in braces, {"a", "b"}. An empty source is valid only for a
+ * string. The value cannot be null.
+ * @throws ValueError, PathError with a message that begins with the property's name
  */
 Value parsePropertyValue(std::string_view source, const Property& property, const Schema& schema,
                          const std::string& defaultNameSpace);

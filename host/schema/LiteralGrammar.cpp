@@ -11,7 +11,7 @@
 namespace cimhost::grammar {
 namespace {
 
-/** @param prefix, suffix number of characters around the digits, besides the sign */
+/** @param prefix, suffix number of characters before and after the digits, without the sign */
 Literal readInteger(std::string_view source, std::size_t prefix, std::size_t suffix, int base) {
     IntegerLiteral integer;
     std::string_view digits = source;
@@ -39,7 +39,7 @@ Literal readReal(std::string_view source) {
 
 Literal readCharacter(std::string_view content) {
     const std::string source = "'" + std::string(content) + "'";
-    if (content.size() > 2 && content[0] == '\\') {  // a \x escape is the code unit, also of a surrogate
+    if (content.size() > 2 && content[0] == '\\') {  // a \x escape is a code unit, possibly a surrogate
         std::uint16_t unit = 0;
         std::from_chars(content.data() + 2, content.data() + content.size(), unit, 16);
         return {Char16{unit}, source};

@@ -14,11 +14,11 @@ namespace peg = tao::pegtl;
 
 using Node = peg::parse_tree::node;
 
-/** A rule, as the argument of the function that returns its message. */
+/** Selects the overload of the function that returns the message of a rule. */
 template <typename Rule>
 struct Tag {};
 
-/** The rules without a message. Base of the messages of a grammar, which overload the function for their rules. */
+/** Returns no message. The messages of a grammar derive from it and overload of() for the rules that have one. */
 struct NoMessages {
     template <typename Rule>
     static constexpr const char* of(Tag<Rule>) {
@@ -26,13 +26,13 @@ struct NoMessages {
     }
 };
 
-/** The errors of a grammar. Messages::of(Tag<Rule>) returns the message if a required rule does not match. */
+/** The errors of a grammar. Messages::of(Tag<Rule>) returns the message for a required rule that does not match. */
 template <typename Messages>
 struct Errors {
     template <typename Rule>
     static constexpr const char* message = Messages::of(Tag<Rule>{});
     template <typename Rule>
-    static constexpr bool raise_on_failure = false;  // the rules are also used where they may fail
+    static constexpr bool raise_on_failure = false;  // the rules are also used where they are optional
 };
 
 struct NameStart : peg::sor<peg::alpha, peg::one<'_'>> {};
@@ -65,7 +65,7 @@ struct Escape : peg::seq<peg::one<'\\'>, peg::sor<UnitEscape, peg::one<'b', 't',
 struct CharacterContent : peg::sor<Escape, peg::utf8::not_one<'\'', '\\', '\n', '\r'>> {};
 struct CharacterLiteral : peg::seq<peg::one<'\''>, CharacterContent, peg::one<'\''>> {};
 
-/** The content of a string literal. @tparam Refused characters that end it, such as line ends in MOF */
+/** The content of a string literal. @tparam Refused characters that it cannot contain, such as line ends in MOF */
 template <char... Refused>
 struct StringContent : peg::star<peg::sor<Escape, peg::not_one<'"', '\\', Refused...>>> {};
 
@@ -77,10 +77,10 @@ using LiteralNodes =
     peg::parse_tree::store_content::on<NullLiteral, TrueLiteral, FalseLiteral, RealLiteral, BinaryLiteral, HexLiteral,
                                        OctalLiteral, DecimalLiteral, CharacterContent>;
 
-/** Converts one of the LiteralNodes. @throws ValueError if a character does not have 16 bits */
+/** Converts one of the LiteralNodes. @throws ValueError if a character has more than 16 bits */
 Literal readLiteral(const Node& node);
 
-/** The first child of this rule, or null. */
+/** The first child that matched this rule, or null. */
 template <typename Rule>
 const Node* findChild(const Node& node) {
     for (const auto& child : node.children) {
@@ -91,7 +91,7 @@ const Node* findChild(const Node& node) {
     return nullptr;
 }
 
-/** All children of this rule. */
+/** All children that matched this rule. */
 template <typename Rule>
 std::vector<const Node*> children(const Node& node) {
     std::vector<const Node*> found;

@@ -20,7 +20,7 @@ void buildMof(Schema& schema, const grammar::Node& root, std::function<void(cons
 /** The literal of a MOF constant. Adjacent strings are joined. An alias results in NULL. */
 Literal constantLiteral(const grammar::Node& constant);
 
-/** An error in a MOF file, with file, line and column. */
+/** Returns an error in a MOF file, whose message begins with the file, line and column. */
 LoadError errorAt(const tao::pegtl::position& position, const std::string& message);
 
 }  // namespace cimhost

@@ -2,7 +2,7 @@
 
 #include "schema/LiteralGrammar.h"
 
-/** The grammar of MOF (CIM 2) as PEGTL rules, bottom up. After the first token of a rule, the others are required. */
+/** The grammar of MOF (CIM 2) as PEGTL rules, bottom up. After the first token of a rule, the rest is required. */
 namespace cimhost::grammar::mof {
 
 struct LineComment : peg::seq<peg::two<'/'>, peg::until<peg::eolf>> {};

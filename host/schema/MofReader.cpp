@@ -32,7 +32,7 @@ std::string contentOf(const std::filesystem::path& file) {
     return content.str();
 }
 
-/** The tree of an input, to which it refers. @tparam Rule of the complete input  @throws tao::pegtl::parse_error */
+/** Parses an input, which must outlive the tree. @tparam Rule matches all of it  @throws tao::pegtl::parse_error */
 template <typename Rule>
 std::unique_ptr<Node> parsed(peg::memory_input<>& input) {
     return peg::parse_tree::parse<Rule, Node, mof::Selected, peg::nothing, mof::Control>(input);

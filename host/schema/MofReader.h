@@ -12,9 +12,10 @@
 namespace cimhost {
 
 /**
- * Reads MOF: qualifier declarations, classes, instances, and files named by #pragma include, relative to the
- * including file. Each file is read once. Errors are reported as LoadError with file, line and column. After a syntax
- * error, nothing of the source is added to the schema; after other errors, the declarations before it are.
+ * Reads MOF: qualifier declarations, classes, instances, and the files that #pragma include names relative to the
+ * including file. Each file is read once. An error is a LoadError with file, line and column; if readFile() cannot read
+ * its file, with the file only. If a source has a syntax error, none of its declarations is added to the schema; after
+ * another error, the schema contains the declarations that precede it.
  */
 class MofReader {
 public:
@@ -22,7 +23,7 @@ public:
 
     void readFile(const std::filesystem::path& file);
 
-    /** @param sourceName instead of a file name in messages  @param directory of included files */
+    /** @param sourceName replaces the file name in messages  @param directory base of included files */
     void readSource(std::string_view source, const std::string& sourceName,
                     const std::filesystem::path& directory = {});
 
@@ -33,7 +34,7 @@ private:
     std::set<std::filesystem::path> filesRead;
 };
 
-/** Reads the values of an array in MOF's form, {1, 2} or {"a", "b"}. @throws ValueError for another source */
+/** Reads the values of an array in MOF's form, {1, 2} or {"a", "b"}. @throws ValueError for another form */
 std::vector<Literal> readMofArray(std::string_view source);
 
 }  // namespace cimhost

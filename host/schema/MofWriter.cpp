@@ -13,11 +13,11 @@
 namespace cimhost {
 namespace {
 
-/** The shortest digits that are read back as the same number, with the decimal point that MOF requires. */
+/** The shortest number that is read back as the same value, with the decimal point that MOF requires. */
 template <typename Real>
 std::string formatReal(Real value) {
     if (!std::isfinite(value)) {
-        return "NULL";  // MOF cannot express infinity and NaN
+        return "NULL";  // MOF cannot express infinity or NaN
     }
     std::array<char, 64> digits{};
     const auto end = std::to_chars(digits.data(), digits.data() + digits.size(), value).ptr;
@@ -37,7 +37,7 @@ std::string formatCharacter(Char16 character) {
     return literal.data();
 }
 
-/** Some compilers accept literals of up to 1,023 bytes. A character takes up to six. */
+/** Some compilers accept literals of at most 1,023 bytes. A character is written with up to six. */
 constexpr std::size_t longestLiteral = 1000;
 
 /** The number of bytes of a string that fit into one literal. */
@@ -52,7 +52,7 @@ std::size_t bytesOfLiteral(std::string_view string) {
     return string.size();
 }
 
-/** A string as one literal per line, which compilers join. */
+/** Formats a string as literals, one per line, which compilers join. */
 std::string inLiterals(std::string_view string) {
     const std::string valid = cim::replaceInvalidUtf8(string);
     std::string literals;

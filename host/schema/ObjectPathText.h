@@ -9,17 +9,17 @@
 namespace cimhost {
 
 /**
- * Reads an untyped WBEM URI: [//host/][namespace:]Class[.Key=value,...]. Values are quoted strings, numbers, true and
- * false; a reference is a quoted path. Keys have the types that the class declares; those of an unknown class are
- * strings, uint64 or (negative) sint64, real64 and booleans. Keys may be missing.
+ * Reads an untyped WBEM URI: [//host/][namespace:]Class[.Key=value,...]. Values are strings in quotation marks,
+ * characters in apostrophes, numbers, true and false. The value of a reference is a path in quotation marks. Keys have
+ * the types that the class declares; a key of an unknown class has the literalType(). Keys can be missing.
  *
- * @param defaultNameSpace of paths, and of references, without a namespace
- * @throws PathError if the string is not a path, the class does not have a key, a key occurs twice, or a value does not
- * match its key's type
+ * @param defaultNameSpace the namespace of a path or a reference that does not name one
+ * @throws PathError if the string is not a path, the class does not have a key, a key occurs twice or is null, or a
+ * value does not match its key's type
  */
 ObjectPath parseObjectPath(std::string_view uri, const Schema& schema, const std::string& defaultNameSpace);
 
-/** Formats a path as parseObjectPath() reads it. A null key value, which is not valid, is written as NULL. */
+/** Formats a path so that parseObjectPath() can read it. A null key value, which is not valid, is written as NULL. */
 std::string formatObjectPath(const ObjectPath& path);
 
 }  // namespace cimhost

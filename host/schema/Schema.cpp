@@ -17,7 +17,7 @@ void inheritQualifiers(std::vector<Qualifier>& own, const std::vector<Qualifier>
     }
 }
 
-/** Marks an inherited property or method with its qualifiers. */
+/** Marks an inherited property or method, and its qualifiers, as propagated. */
 template <class Element>
 void markPropagated(Element& inherited) {
     inherited.isPropagated = true;

@@ -13,14 +13,14 @@
 
 namespace cimhost {
 
-/** Whether a qualifier is inherited, and whether subclasses may override it. */
+/** Whether a qualifier is inherited, and whether subclasses can override it. */
 struct Flavor {
     bool toSubclass = true;   ///< inherited by subclasses and overriding properties
-    bool overridable = true;  ///< they may change its value
+    bool overridable = true;  ///< subclasses can change its value
     bool translatable = false;
 };
 
-/** A qualifier of a class or property, declared there or inherited. */
+/** A qualifier of a class, property, method or parameter, declared there or inherited. */
 struct Qualifier {
     std::string name{};
     Value value{};
@@ -31,14 +31,14 @@ struct Qualifier {
 /** Whether a qualifier exists and is true. */
 bool isTrue(const Qualifier* qualifier);
 
-/** Kinds of elements that a qualifier may qualify, as CIM-XML names them. */
+/** Kinds of elements that a qualifier can apply to, with their names in CIM-XML. */
 constexpr std::array<std::string_view, 7> scopeNames{"CLASS",  "ASSOCIATION", "REFERENCE", "PROPERTY",
                                                      "METHOD", "PARAMETER",   "INDICATION"};
 
 /** A set of these kinds, by their position in scopeNames. */
 using Scope = std::bitset<scopeNames.size()>;
 
-/** Declaration of a qualifier: type and default value. */
+/** Declaration of a qualifier. */
 struct QualifierDeclaration {
     std::string name{};
     CMPIType type = CMPI_boolean;
@@ -46,7 +46,7 @@ struct QualifierDeclaration {
     Value defaultValue{};
     Flavor flavor{};
     Scope scope{};
-    bool standard = false;  ///< declared by the CIM standard; a MOF file may declare it again
+    bool standard = false;  ///< declared by the CIM standard; a MOF file can declare it again
 };
 
 /** Declarations of the CIM standard's qualifiers, which MOF files may use without declaring them. */
@@ -58,7 +58,7 @@ struct Property {
     CMPIType type = CMPI_null;  ///< element type; CMPI_ref for a reference
     bool isArray = false;
     std::string referenceClass{};  ///< of a reference, the class that it refers to; empty otherwise
-    Value defaultValue{};          ///< of the property's type; null without a default
+    Value defaultValue{};          ///< of the property's type; null if there is no default
     std::vector<Qualifier> qualifiers{};
     std::string origin{};       ///< name of the class that declares it first
     bool isPropagated = false;  ///< inherited and not overridden
@@ -66,11 +66,11 @@ struct Property {
     const Qualifier* findQualifier(std::string_view qualifier) const { return cim::findNamed(qualifiers, qualifier); }
     bool isKey() const { return isTrue(findQualifier("Key")); }
 
-    /** Whether clients may modify it: its qualifier Write is true. */
+    /** Whether clients can modify the property: its Write qualifier is true. */
     bool isWritable() const { return isTrue(findQualifier("Write")); }
 };
 
-/** A method with its parameters; this host does not call methods. */
+/** A method with its parameters. This host does not call methods. */
 struct Method {
     std::string name{};
     std::string origin{};
@@ -80,7 +80,7 @@ struct Method {
     std::vector<Property> parameters{};
 };
 
-/** A class with all its properties: inherited ones first, then those it declares, in the order of declaration. */
+/** A class with all its properties: first the inherited ones, also if overridden, then the others. */
 struct Class {
     std::string name{};
     std::string superclass{};  ///< empty: none
@@ -100,13 +100,13 @@ struct Class {
  */
 class Schema {
 public:
-    /** Contains the standard qualifiers. */
+    /** Creates a schema with the standard qualifiers. */
     Schema();
 
     /** The class of this name, or null. */
     const Class* findClass(std::string_view name) const;
 
-    /** All classes in the order in which they were added. Adding a class ends the validity of iterators. */
+    /** All classes in the order in which they were added. Adding a class invalidates iterators. */
     const std::vector<const Class*>& classes() const { return inOrder; }
 
     /** Whether a class is the ancestor or derived from it. An unknown class has no ancestors. */
@@ -117,7 +117,7 @@ public:
 
     /**
      * Adds a class and the elements that it inherits.
-     * @param declared with only the properties and methods that it declares
+     * @param declared the class, with only the properties and methods that it declares
      * @throws std::invalid_argument if the class exists, its superclass does not, a property is declared twice, or an
      * overriding property has another type
      */
@@ -125,10 +125,13 @@ public:
 
     const QualifierDeclaration* findQualifier(std::string_view name) const;
 
-    /** All qualifier declarations, by name. */
+    /** All qualifier declarations, sorted by name. */
     std::vector<const QualifierDeclaration*> qualifiers() const;
 
-    /** Adds a declaration; a standard one may be given again, any other with the same name is std::invalid_argument. */
+    /**
+     * Adds a declaration, or replaces a standard one.
+     * @throws std::invalid_argument if a declaration that is not standard has the same name
+     */
     void add(QualifierDeclaration declaration);
 
     /** The instances of MOF files ("instance of"), in order. */

@@ -3,8 +3,8 @@
 namespace cimhost {
 namespace {
 
-constexpr Flavor open{true, true, false};         // inherited, may be overridden
-constexpr Flavor fixed{true, false, false};       // inherited, may not be overridden
+constexpr Flavor open{true, true, false};         // inherited, can be overridden
+constexpr Flavor fixed{true, false, false};       // inherited, cannot be overridden
 constexpr Flavor restricted{false, true, false};  // not inherited
 constexpr Flavor translatable{true, true, true};
 

@@ -13,14 +13,14 @@ namespace cimhost {
 std::string inQuotes(std::string_view string);
 
 /**
- * Replaces the escapes of a string literal by their characters. A \x escape is a UTF-16 code unit, and a surrogate pair
- * is one character.
+ * Replaces the escapes of a string literal with their characters. A \x escape is a UTF-16 code unit, and a surrogate
+ * pair is one character.
  * @param content the literal without its quotation marks; the grammar has checked its escapes
- * @throws ValueError for a single surrogate, and for a null character, which CMPI strings cannot contain
+ * @throws ValueError for an unpaired surrogate, and for a null character, which CMPI strings cannot contain
  */
 std::string unescaped(std::string_view content);
 
-/** The character of a UTF-8 string with exactly one character of 16 bits; none for other strings. */
+/** The character of a UTF-8 string that consists of one character up to U+FFFF; none for other strings. */
 std::optional<std::uint16_t> singleCharacter(std::string_view string);
 
 }  // namespace cimhost
