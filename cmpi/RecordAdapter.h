@@ -28,10 +28,7 @@ public:
      */
     using ElementAdapter<RecordAdapter, Traits>::ElementAdapter;
 
-    /**
-     * Returns the path of the current record. Returns a path without a key if there is no current record, and null if
-     * the broker cannot create the path.
-     */
+    /** The path of the current record; without a key if there is no record; null if the broker cannot create a path. */
     CMPIObjectPath* getObjectPath();
 
     /**

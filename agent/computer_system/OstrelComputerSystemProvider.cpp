@@ -29,9 +29,7 @@ struct Computer {
     std::optional<std::string> productName;  ///< "model - suffix"
 };
 
-/**
- * The part of the product name before the first hyphen, without trailing spaces. None if there is no product name.
- */
+/** The product name before its first hyphen, without trailing spaces. None if there is no product name. */
 std::optional<std::string> modelOf(const Computer& computer) {
     if (!computer.productName) {
         return std::nullopt;

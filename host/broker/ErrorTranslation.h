@@ -45,10 +45,7 @@ CMPIStatus guarded(Body&& body) {
     }
 }
 
-/**
- * Runs the body of a function that returns a value. After an exception, returns `failed`.
- * @param rc receives the status; can be null
- */
+/** Runs the body of a function that returns a value. After an exception, returns `failed`. @param rc status or null */
 template <class Result, class Body>
 Result guarded(CMPIStatus* rc, Result failed, Body&& body) {
     Result result = failed;
