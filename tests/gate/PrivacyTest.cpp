@@ -2,7 +2,7 @@
 #include "support/Files.h"
 #include "support/FullDisk.h"
 
-// The message of a refused request must not contain data of other clients.
+// Checks that the message of a refused request does not contain data of other clients.
 
 namespace gatetest {
 namespace {
@@ -12,7 +12,7 @@ using testing::Not;
 using testsupport::FullDisk;
 using Outcomes = std::vector<Outcome>;
 
-/** Of two clients, the first has stored strings with its name in every writable place. */
+/** Two clients, the first of which has stored strings that contain its name in leases, a warranty and asset data. */
 class PrivacyTest : public GateTest {
 protected:
     static constexpr const char* first = "alice-with-a-name-of-some-length";
