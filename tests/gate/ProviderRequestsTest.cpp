@@ -13,8 +13,8 @@ using testsupport::uint16;
 using Names = std::vector<std::string>;
 
 /**
- * The leases of both computers, another lease, and the warranty of the first computer. The gate has checked both record
- * classes for their first requests.
+ * The leases of both computers, another lease, and the warranty of the first computer. The gate has already compared
+ * the records of both classes with their files, which takes further requests.
  */
 class ProviderRequestsTest : public GateTest {
 protected:
