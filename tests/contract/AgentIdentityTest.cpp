@@ -43,7 +43,10 @@ protected:
         return all;
     }
 
-    /** Returns whether GetInstance returns the agent for a path with these keys. Fails on any other response. */
+    /**
+     * Returns whether GetInstance returns the agent for a path with these keys. Fails the test unless the response is
+     * the agent or is empty.
+     */
     bool isTheAgent(const std::vector<NamedValue>& keysOfPath) {
         agentEnvironment::forgetLog();
         const Outcome outcome = provider().getInstance(path(keysOfPath));
@@ -180,7 +183,7 @@ TEST_F(AgentIdentityTest, KeysOfOtherTypesAreIgnored) {
     EXPECT_THAT(comparedTypes(), IsEmpty());
 }
 
-TEST_F(AgentIdentityTest, EnumerationPathsAreComparedToo) {
+TEST_F(AgentIdentityTest, KeysOfEnumerationPathsAreCompared) {
     EXPECT_THAT(provider().enumerateInstanceNames(path({named("Vendor", text("other"))})).events, IsEmpty());
     EXPECT_THAT(provider().enumerateInstances(path({named("Vendor", text("other"))})).events, IsEmpty());
     EXPECT_EQ(provider().enumerateInstanceNames(path({named("Vendor", text("VEL"))})).paths().size(), 1U);

@@ -171,7 +171,7 @@ TEST_F(AssetReadingTest, KeysWithOtherNamesOrTypesAreIgnored) {
     EXPECT_EQ(provider().getInstance(path({named("Name", testsupport::nullOf(CMPI_string))})).instances().size(), 1U);
 }
 
-TEST_F(AssetReadingTest, EnumerationPathsAreComparedToo) {
+TEST_F(AssetReadingTest, KeysOfEnumerationPathsAreCompared) {
     const ObjectPath other = path({named("Name", text("other"))});
     EXPECT_THAT(provider().enumerateInstances(other).instances(), IsEmpty());
     EXPECT_THAT(provider().enumerateInstanceNames(other), isOk(1));
