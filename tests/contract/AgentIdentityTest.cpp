@@ -114,7 +114,7 @@ TEST_F(AgentIdentityTest, ItIsInTheRequestsNamespace) {
     EXPECT_EQ(paths[0].nameSpace, "root/other");
 }
 
-TEST_F(AgentIdentityTest, ItIsReturnedForAllItsKeys) {
+TEST_F(AgentIdentityTest, TheInstanceIsReturnedForAllItsKeys) {
     EXPECT_TRUE(isTheAgent(keys()));
     const auto got = provider().getInstance(path(keys())).instances();
     const auto enumerated = provider().enumerateInstances(classPath(identityClass)).instances();
@@ -122,7 +122,7 @@ TEST_F(AgentIdentityTest, ItIsReturnedForAllItsKeys) {
     EXPECT_EQ(shown(got[0].properties), shown(enumerated.at(0).properties));
 }
 
-TEST_F(AgentIdentityTest, ItIsNotReturnedIfOneKeyDiffers) {
+TEST_F(AgentIdentityTest, TheInstanceIsNotReturnedIfOneKeyDiffers) {
     for (const char* name : {"Name", "IdentifyingNumber", "ProductName", "Vendor", "Version"}) {
         EXPECT_FALSE(isTheAgent(keys({named(name, text("other"))}))) << name;
         EXPECT_FALSE(isTheAgent(keys({named(name, text(""))}))) << name;
