@@ -141,7 +141,8 @@ TEST_P(BrokerFailureTest, AFailureOfReturnDoneIsIgnored) {
 
 INSTANTIATE_RECORD_TEST(BrokerFailureTest);
 
-/** Lets each call that a request makes fail, in two ways. Memory and file stay consistent. */
+/** Each call that a request makes fails once with an error status and once with null. Memory and file stay consistent.
+ */
 class EveryCallFailsTest : public RecordTest {
 protected:
     using RequestCall = std::function<Outcome()>;

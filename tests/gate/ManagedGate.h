@@ -26,7 +26,7 @@ public:
     Instance instanceOf(const ObjectPath& path);
     ///@}
 
-    /** @name Requests that may fail: return the client's status with the provider's message */
+    /** @name Requests that can fail: return the client's status with the provider's message */
     ///@{
     cimhost::Status ask(const cimhost::Request& request);
     cimhost::Status create(const std::string& id, std::vector<NamedValue> properties, const std::string& of = lease);

@@ -22,8 +22,8 @@ struct BareResponse {
 };
 
 /**
- * A request and its expected responses. The records firstNode, "L" and secondNode exist, as leases and as
- * warranties. Responses have the format of Formatting.h, with the changes of the data files.
+ * A request and its expected responses. The records firstNode, "L" and secondNode exist, as leases and as warranties.
+ * Responses have the format of Formatting.h, with the changes to the data files.
  */
 struct Row {
     std::string name;

@@ -29,7 +29,7 @@ protected:
         return response;
     }
 
-    std::string received;  ///< response of the client and changes of the files
+    std::string received;  ///< response to the client and changes to the files
     SilentLog silence;
 };
 

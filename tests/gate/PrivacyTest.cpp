@@ -90,7 +90,7 @@ TEST_F(PrivacyTest, AFullDiskDoesNotRevealOtherRecords) {
         const FullDisk disk(leases.size() + 10);
         expectNothingOfFirst({create(second), create(second, {large}), modify(ofFirst, {large})});
     }
-    const FullDisk disk(leases.size() / 2);  // too small even for the old content
+    const FullDisk disk(leases.size() / 2);  // smaller than the old content
     expectNothingOfFirst({modify("shared", {large}), remove("shared")});
     const FullDisk none(1);
     expectNothingOfFirst({modifyAsset({named("AssetNumber", text(second))})});

@@ -6,8 +6,8 @@
 #include <vector>
 
 /**
- * Test double of the framework's locks, files and property files. Records the calls of the asset element and whether
- * the lock was held, and injects failures.
+ * Test double of the framework's locks, files and property files. Records the calls that the asset element makes and
+ * whether the lock was held, and injects failures.
  */
 namespace assetFileDouble {
 
