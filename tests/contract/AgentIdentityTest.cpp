@@ -43,7 +43,10 @@ protected:
         return all;
     }
 
-    /** Returns whether GetInstance returns the agent for a path with these keys. Fails on any other response. */
+    /**
+     * Returns whether GetInstance returns the agent for a path with these keys. Fails the test unless the response is
+     * the agent or is empty.
+     */
     bool isTheAgent(const std::vector<NamedValue>& keysOfPath) {
         agentEnvironment::forgetLog();
         const Outcome outcome = provider().getInstance(path(keysOfPath));
@@ -111,7 +114,7 @@ TEST_F(AgentIdentityTest, ItIsInTheRequestsNamespace) {
     EXPECT_EQ(paths[0].nameSpace, "root/other");
 }
 
-TEST_F(AgentIdentityTest, ItIsReturnedForAllItsKeys) {
+TEST_F(AgentIdentityTest, TheInstanceIsReturnedForAllItsKeys) {
     EXPECT_TRUE(isTheAgent(keys()));
     const auto got = provider().getInstance(path(keys())).instances();
     const auto enumerated = provider().enumerateInstances(classPath(identityClass)).instances();
@@ -119,7 +122,7 @@ TEST_F(AgentIdentityTest, ItIsReturnedForAllItsKeys) {
     EXPECT_EQ(shown(got[0].properties), shown(enumerated.at(0).properties));
 }
 
-TEST_F(AgentIdentityTest, ItIsNotReturnedIfOneKeyDiffers) {
+TEST_F(AgentIdentityTest, TheInstanceIsNotReturnedIfOneKeyDiffers) {
     for (const char* name : {"Name", "IdentifyingNumber", "ProductName", "Vendor", "Version"}) {
         EXPECT_FALSE(isTheAgent(keys({named(name, text("other"))}))) << name;
         EXPECT_FALSE(isTheAgent(keys({named(name, text(""))}))) << name;
@@ -180,7 +183,7 @@ TEST_F(AgentIdentityTest, KeysOfOtherTypesAreIgnored) {
     EXPECT_THAT(comparedTypes(), IsEmpty());
 }
 
-TEST_F(AgentIdentityTest, EnumerationPathsAreComparedToo) {
+TEST_F(AgentIdentityTest, KeysOfEnumerationPathsAreCompared) {
     EXPECT_THAT(provider().enumerateInstanceNames(path({named("Vendor", text("other"))})).events, IsEmpty());
     EXPECT_THAT(provider().enumerateInstances(path({named("Vendor", text("other"))})).events, IsEmpty());
     EXPECT_EQ(provider().enumerateInstanceNames(path({named("Vendor", text("VEL"))})).paths().size(), 1U);

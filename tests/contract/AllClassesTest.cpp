@@ -8,8 +8,8 @@
 #include "schema/MofReader.h"
 #include "schema/MofWriter.h"
 
-// Properties of every class: the table below matches the MOF, keys have the order of paths and other properties the
-// order of instances, and the operations are consistent with each other.
+// Checks for every class that the table below matches the MOF file, and that the operations are consistent with each
+// other. The MOF file declares keys in the order of paths, and other properties in the order of instances.
 
 namespace contract {
 namespace {
@@ -121,7 +121,7 @@ const std::vector<ClassRow>& classes() {
     return all;
 }
 
-/** Returns names and types of some rows as a string. */
+/** Returns a string with name and type for each accepted row. */
 template <class Accepts>
 std::vector<std::string> described(const std::vector<PropertyRow>& rows, Accepts accepts) {
     std::vector<std::string> strings;
@@ -140,7 +140,7 @@ cimhost::Schema readSchema() {
     return read;
 }
 
-/** Returns the classes that the MOF files declare. */
+/** Returns the classes that the MOF file declares. */
 const cimhost::Schema& schema() {
     static const cimhost::Schema read = readSchema();
     return read;
@@ -151,7 +151,7 @@ bool isWritable(const cimhost::Property& property) {
     return write != nullptr && std::get<bool>(write->value.single);
 }
 
-/** Returns a unique value for a property that differs from the test data. */
+/** Returns a value that differs from the property's value in the test data. */
 cimhost::Value otherValue(const PropertyRow& row) {
     const std::string name = row.name;
     switch (row.type) {
@@ -166,7 +166,7 @@ cimhost::Value otherValue(const PropertyRow& row) {
     }
 }
 
-/** Returns a property as a string without values that change over time. */
+/** Returns a property as a string. Omits a value that changes over time. */
 std::string comparable(const NamedValue& property) {
     return property.name == "LocalDateTime" ? property.name.string() : shown({property}).at(0);
 }
@@ -255,7 +255,7 @@ TEST_P(AllClassesTest, InstancesHaveThePropertiesInOrder) {
     }
 }
 
-TEST_P(AllClassesTest, NamesAndInstancesAreTheSameSet) {
+TEST_P(AllClassesTest, EnumeratedNamesAreThePathsOfEnumeratedInstances) {
     std::vector<ObjectPath> ofInstances;
     for (const Instance& instance : instances()) {
         ofInstances.push_back(instance.path);
@@ -278,7 +278,7 @@ TEST_P(AllClassesTest, PathsHaveTheClassAndItsKeys) {
     }
 }
 
-TEST_P(AllClassesTest, KeyPropertiesAreThePathsKeys) {
+TEST_P(AllClassesTest, KeyPropertiesEqualTheKeysOfThePath) {
     for (const Instance& instance : instances()) {
         for (const NamedValue& each : instance.path.keys) {
             const cimhost::Value* property = testsupport::find(instance.properties, each.name);
@@ -288,7 +288,7 @@ TEST_P(AllClassesTest, KeyPropertiesAreThePathsKeys) {
     }
 }
 
-TEST_P(AllClassesTest, GetReturnsEachEnumeratedNameExceptAssociations) {
+TEST_P(AllClassesTest, GetReturnsEachEnumeratedInstanceExceptAssociations) {
     for (const Instance& enumerated : instances()) {
         const Outcome outcome = provider().getInstance(enumerated.path);
         if (!row().supportsGet) {

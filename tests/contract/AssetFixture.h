@@ -10,7 +10,7 @@ namespace contract {
 constexpr const char* assetClass = "VELKO_AssetIDDetails";
 constexpr const char* assetFile = "asset.dat";
 
-/** Tests of the computer's asset identification and its file. */
+/** Fixture for tests of the computer's asset data and its file. */
 class AssetTest : public ProviderTest {
 protected:
     static ObjectPath path(std::vector<NamedValue> keys = {});
@@ -21,10 +21,10 @@ protected:
     /** Returns the only instance. Fails the test and returns an empty instance if there is not exactly one. */
     Instance asset();
 
-    /** Returns its properties as "Name=value", except LocalDateTime. */
+    /** Returns the properties of the instance as "Name=value", except LocalDateTime. */
     std::vector<std::string> assetProperties();
 
-    /** Returns one of its properties as a string: "NULL" for null, "(none)" if it does not exist. */
+    /** Returns a property of the instance as a string: "NULL" for null, "(none)" if the property does not exist. */
     std::string property(const std::string& name);
 
     /** Modifies these properties. Fails the test unless the request succeeds without results. */

@@ -4,8 +4,8 @@
 
 #include "AssetFixture.h"
 
-// The provider holds no lock while it calls the object manager: such a call may make another request that needs the
-// asset file.
+// Checks that the provider holds no lock while it calls the object manager, since such a call can lead to another
+// request that needs the asset file.
 
 namespace contract {
 namespace {
@@ -14,7 +14,7 @@ using testing::SizeIs;
 using testsupport::named;
 using testsupport::text;
 
-/** Functions of the object manager that run an action first. Only one instance may exist. */
+/** Functions of the object manager that run an action first. Only one instance may exist at a time. */
 class Interruption {
 public:
     Interruption(const CMPIBroker& original, std::function<void()> itsBody)
@@ -28,7 +28,7 @@ public:
     Interruption(const Interruption&) = delete;
     Interruption& operator=(const Interruption&) = delete;
 
-    /** Returns a broker whose creating functions run the action. */
+    /** Returns a broker whose functions that create paths and instances run the action. */
     const CMPIBroker* broker() const { return &brokerHandle; }
 
     /** Returns a result whose functions run the action. */
@@ -104,7 +104,7 @@ protected:
     }
 };
 
-TEST_F(AssetLockTest, ResultFunctionsMayMakeAnotherRequest) {
+TEST_F(AssetLockTest, ResultFunctionsCanMakeAnotherRequest) {
     writeData(assetFile, "USER.AssetNumber=A-1\n");
     Interruption interruption(*broker.handle(), [this] { readAndWrite(); });
     CMPIInstanceMI* interface = provider().instanceMI();
@@ -122,7 +122,7 @@ TEST_F(AssetLockTest, ResultFunctionsMayMakeAnotherRequest) {
     EXPECT_EQ(interruption.count, 4);
 }
 
-TEST_F(AssetLockTest, BrokerFunctionsMayMakeAnotherRequest) {
+TEST_F(AssetLockTest, BrokerFunctionsCanMakeAnotherRequest) {
     writeData(assetFile, "USER.AssetNumber=A-1\n");
     Interruption interruption(*broker.handle(), [this] { readAndWrite(); });
     CMPIStatus status{CMPI_RC_OK, nullptr};

@@ -3,7 +3,7 @@
 #include "AssetFixture.h"
 #include "ThrowingObjects.h"
 
-// Modification of the asset identification.
+// Modification of asset data.
 
 namespace contract {
 namespace {
@@ -67,7 +67,7 @@ TEST_F(AssetModificationTest, EveryKeyIsWrittenInOrder) {
                             "USER.PersonalizedData4", "USER.PersonalizedLabel5", "USER.PersonalizedData5"));
 }
 
-TEST_F(AssetModificationTest, ItIsVisibleToTheNextRequestAndTheNextProcess) {
+TEST_F(AssetModificationTest, AModificationIsVisibleToTheNextRequestAndAfterReloading) {
     const std::vector<NamedValue> changes{named("AssetNumber", text("A-2")),
                                           named("PrimaryOwnerName", text("Bob")),
                                           named("LastInventoried", dateTime("20260102030405.000000+060")),
@@ -147,7 +147,7 @@ TEST_F(AssetModificationTest, AllFivePairsAreStored) {
     }
 }
 
-TEST_F(AssetModificationTest, AnOmittedPairRepeatsThePrecedingOne) {
+TEST_F(AssetModificationTest, AnOmittedPairRepeatsThePrecedingPair) {
     modify({named("PersonalizedLabel2", text("Room"))});
     EXPECT_THAT(storedPairs(), ElementsAre("|", "Room|", "Room|", "Room|", "Room|"));
     EXPECT_EQ(property("PersonalizedLabel1"), "\"Null\"");
@@ -175,7 +175,7 @@ TEST_F(AssetModificationTest, AnEmptyValueIsRepeatedAsEmpty) {
     EXPECT_THAT(storedPairs(), ElementsAre("L1|", "|", "|", "|", "|"));
 }
 
-TEST_F(AssetModificationTest, ADateMayBeSentAsAString) {
+TEST_F(AssetModificationTest, ADateCanBeSentAsAString) {
     modify({named("LastInventoried", text("20260102030405.000000+060"))});
     EXPECT_EQ(property("LastInventoried"), "\"20260102030405.000000+060\"");
 }
@@ -218,7 +218,7 @@ TEST_F(AssetModificationTest, ANullInstanceWritesNothing) {
     EXPECT_THAT(loggedFailures(), IsEmpty());
 }
 
-TEST_F(AssetModificationTest, APathThatSelectsNothingStillWrites) {
+TEST_F(AssetModificationTest, AModificationWithAPathThatSelectsNothingIsWritten) {
     const ObjectPath other = path({named("Version", text("other"))});
     EXPECT_THAT(provider().modifyInstance(other, clientInstance(other, {named("AssetNumber", text("A-2"))})), isOk(0));
     EXPECT_EQ(stored("USER.AssetNumber"), "A-2");
@@ -255,7 +255,7 @@ TEST_F(AssetModificationTest, AFailureToOpenTheFileIsOnlyLogged) {
     blockData(assetFile);
     modify({named("AssetNumber", text("A-2"))});
     EXPECT_TRUE(isLogged(writingFailed));
-    EXPECT_THAT(loggedFailures(), IsEmpty()) << "not as an error";
+    EXPECT_THAT(loggedFailures(), IsEmpty()) << "the failure is not logged as an error";
     EXPECT_TRUE(fs::is_directory(dataFile(assetFile)));
     EXPECT_EQ(property("AssetNumber"), "(none)");
 }

@@ -3,7 +3,7 @@
 #include "AssetFixture.h"
 #include "support/AgentConfiguration.h"
 
-// The asset identification with missing nodes or properties, and with more than one computer.
+// Asset data with missing nodes or properties, and with more than one computer.
 
 namespace contract {
 namespace {
@@ -136,7 +136,7 @@ TEST_F(AssetNodesTest, WithoutASystemTheFileIsNotRead) {
     EXPECT_EQ(readData(assetFile), "USER.AssetNumber=A-1\n");
 }
 
-TEST_F(AssetNodesTest, AModificationWithoutReadingOverwritesTheFile) {
+TEST_F(AssetNodesTest, AModificationOfAnUnreadFileClearsTheOtherAssetValues) {
     writeData(assetFile,
               "USER.AssetNumber=A-1\nUSER.AssetIdTag=T-9\nUSER.Name=Ann\nUSER.PersonalizedLabel1=L1\n"
               "USER.PurchaseDate=20240101000000.000000+000\nOTHER.Key=kept\n");

@@ -3,7 +3,7 @@
 
 #include "AssetFixture.h"
 
-// Reading the asset identification.
+// Reads of asset data.
 
 namespace contract {
 namespace {
@@ -81,7 +81,7 @@ TEST_F(AssetReadingTest, EnumerationOfNamesCreatesTheFile) {
     EXPECT_EQ(readData(assetFile), "");
 }
 
-TEST_F(AssetReadingTest, MissingPersonalizedValuesArePlaceholders) {
+TEST_F(AssetReadingTest, MissingPersonalizedValuesAreReturnedAsPlaceholders) {
     writeData(assetFile, "USER.PersonalizedLabel3=Cost centre\n");
     const Instance instance = asset();
     for (const char* number : {"1", "2", "4", "5"}) {
@@ -123,13 +123,13 @@ TEST_F(AssetReadingTest, ThePropertyListIsNotApplied) {
     EXPECT_EQ(outcome.instances()[0].properties.size(), 33U);
 }
 
-TEST_F(AssetReadingTest, ItIsReturnedForAllItsKeys) {
+TEST_F(AssetReadingTest, TheInstanceIsReturnedForAllItsKeys) {
     const Outcome outcome = provider().getInstance(path(keys()));
     EXPECT_THAT(outcome, isOk(1));
     EXPECT_EQ(outcome.instances().size(), 1U);
 }
 
-TEST_F(AssetReadingTest, ItIsNotReturnedIfOneKeyDiffers) {
+TEST_F(AssetReadingTest, TheInstanceIsNotReturnedIfOneKeyDiffers) {
     for (std::size_t index = 0; index < keys().size(); ++index) {
         std::vector<NamedValue> wrong = keys();
         for (const char* value : {"other", "", "TESTHOST", "example maker", "4.2.0 "}) {
@@ -171,7 +171,7 @@ TEST_F(AssetReadingTest, KeysWithOtherNamesOrTypesAreIgnored) {
     EXPECT_EQ(provider().getInstance(path({named("Name", testsupport::nullOf(CMPI_string))})).instances().size(), 1U);
 }
 
-TEST_F(AssetReadingTest, EnumerationPathsAreComparedToo) {
+TEST_F(AssetReadingTest, KeysOfEnumerationPathsAreCompared) {
     const ObjectPath other = path({named("Name", text("other"))});
     EXPECT_THAT(provider().enumerateInstances(other).instances(), IsEmpty());
     EXPECT_THAT(provider().enumerateInstanceNames(other), isOk(1));
@@ -221,7 +221,7 @@ TEST_F(AssetReadingTest, ObjectsThatCannotBeCreatedAreSkipped) {
     EXPECT_THAT(loggedFailures(), IsEmpty());
 }
 
-TEST_F(AssetReadingTest, AssetsCannotBeCreatedOrDeleted) {
+TEST_F(AssetReadingTest, AssetDataCannotBeCreatedOrDeleted) {
     const Instance instance = clientInstance(path(keys()), {named("AssetNumber", text("1"))});
     EXPECT_THAT(provider().createInstance(path(keys()), instance), isRefused(CMPI_RC_ERR_INVALID_CLASS));
     EXPECT_THAT(provider().deleteInstance(path(keys())), isRefused(CMPI_RC_ERR_INVALID_CLASS));

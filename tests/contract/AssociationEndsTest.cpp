@@ -32,7 +32,7 @@ INSTANTIATE_TEST_SUITE_P(Kinds, AssociationEndsTest, testing::Values(leases, war
 
 // Associators of computers.
 
-TEST_P(AssociationEndsTest, AComputerIsAssociatedWithTheRecordWhoseIdentifierIsItsPath) {
+TEST_P(AssociationEndsTest, AComputerIsAssociatedWithTheRecordWhoseIdentifierIsTheComputersPath) {
     writeRecordFile({"A", ofAlpha, ofBeta, "B"});
     for (const auto& [name, identifier] : {std::pair("alpha", ofAlpha), std::pair("beta", ofBeta)}) {
         const Outcome outcome = associatorNames(computerPath(name));
@@ -60,7 +60,7 @@ TEST_P(AssociationEndsTest, AnUnknownComputerHasNoAssociators) {
     EXPECT_THAT(loggedFailures(), IsEmpty());
 }
 
-TEST_P(AssociationEndsTest, AssociatorsAreTheSameAsTheInstancesOfTheElementClass) {
+TEST_P(AssociationEndsTest, AssociatorsEqualTheInstancesOfTheElementClass) {
     writeRecordFile({"A", ofAlpha});
     const Outcome outcome = associators(computerPath("alpha"));
     EXPECT_THAT(outcome, isOk(1));
@@ -78,7 +78,7 @@ TEST_P(AssociationEndsTest, AComputerPathWithoutKeysIsAssociatedWithEveryRecord)
     EXPECT_THAT(loggedFailures(), IsEmpty());
 }
 
-TEST_P(AssociationEndsTest, TheNameMayFollowOtherKeys) {
+TEST_P(AssociationEndsTest, TheNameCanFollowOtherKeys) {
     writeRecordFile({ofBeta});
     const ObjectPath source =
         computerWithKeys({named("CreationClassName", text("VELKO_ComputerSystem")), named("Name", text("beta"))});
@@ -185,7 +185,7 @@ TEST_P(AssociationEndsTest, AnIdentifierThatIsNotANodePathFails) {
     EXPECT_EQ(upCalls(), 0);
 }
 
-TEST_P(AssociationEndsTest, BothDirectionsAreInverse) {
+TEST_P(AssociationEndsTest, TheRecordOfAComputerLeadsBackToTheComputer) {
     writeRecordFile({ofAlpha, ofBeta, ofGamma});
     setComputers({"alpha", "beta"});
     for (const char* name : {"alpha", "beta", "gamma"}) {

@@ -12,7 +12,7 @@ using testing::IsEmpty;
 
 constexpr const char* noComputer = "Could not obtain an instance of Computer System";
 
-/** Values other than 1, which means true. */
+/** Values other than 1. Only 1 means true. */
 constexpr CMPIBoolean otherThanTrue[] = {0, 2, 255};
 
 /** Two computer systems, "alpha" and "beta", and the records "A" and "B". */
@@ -23,14 +23,14 @@ protected:
         setComputers({"alpha", "beta"});
     }
 
-    /** Expects that a request returned no results and no done, and logged one failure. */
+    /** Expects that a request returned neither results nor their end, and logged one failure. */
     void expectOnlyLogged(const Outcome& outcome, const char* message) {
         EXPECT_THAT(outcome, isOk(0));
         EXPECT_THAT(outcome.events, IsEmpty());
         EXPECT_THAT(caughtFailures(), ElementsAre(message));
     }
 
-    /** Expects the same of the three requests that need a computer system from the object manager. */
+    /** Expects this of the four requests that need a computer system from the object manager. */
     void expectAllOnlyLogged(const char* message) {
         expectOnlyLogged(names(), message);
         agentEnvironment::forgetLog();
@@ -44,7 +44,7 @@ protected:
 
 INSTANTIATE_TEST_SUITE_P(Kinds, AssociationFailureTest, testing::Values(leases, warranties), associationName);
 
-TEST_P(AssociationFailureTest, NoComputerSystemEndsTheRequest) {
+TEST_P(AssociationFailureTest, TheLackOfAComputerSystemEndsTheRequest) {
     setComputers({});
     expectAllOnlyLogged(noComputer);
 }
@@ -183,7 +183,7 @@ TEST_P(AssociationFailureTest, ANamespaceThatCannotBeReadIsEmpty) {
     EXPECT_EQ(paths[0].nameSpace, "");
 }
 
-TEST_P(AssociationFailureTest, AClassNameThatCannotBeReadIsNoClass) {
+TEST_P(AssociationFailureTest, AClassNameThatCannotBeReadIsInvalid) {
     broker.failCall("CMPIObjectPathFT.getClassName", 1, CMPI_RC_ERR_FAILED);
     EXPECT_THAT(names(), isRefused(CMPI_RC_ERR_INVALID_CLASS));
 }
@@ -199,7 +199,7 @@ TEST_P(AssociationFailureTest, AComputerThatCannotBeReadIsOmittedFromTheKeys) {
     EXPECT_THAT(loggedFailures(), IsEmpty());
 }
 
-TEST_P(AssociationFailureTest, AFailureOfHasNextEndsTheComputers) {
+TEST_P(AssociationFailureTest, AFailureOfHasNextEndsTheEnumerationOfComputers) {
     broker.failCall("CMPIEnumerationFT.hasNext", 2, CMPI_RC_ERR_FAILED);
     const Outcome outcome = associatorNames(keyedPath(kind().element, ofAlpha));
     EXPECT_THAT(outcome, isOk(1));
@@ -239,7 +239,7 @@ TEST_P(AssociationFailureTest, TheStateOfEnumerationElementsIsIgnored) {
     }
 }
 
-/** An object manager whose enumerations return any number from hasNext. */
+/** An object manager whose enumerations return the given numbers from hasNext. */
 class HasNextDouble {
 public:
     HasNextDouble(testsupport::RecordingBroker& recording, CMPIBoolean itsAnswer, const std::string& computerName)
@@ -260,7 +260,7 @@ public:
 
     const CMPIBroker* broker() const { return &handle; }
 
-    /** Sets the result from the second call on. */
+    /** Sets the result of hasNext from the second call on. */
     void setLaterResult(CMPIBoolean itsAnswer) { later = itsAnswer; }
 
 private:

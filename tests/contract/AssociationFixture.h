@@ -36,13 +36,13 @@ inline std::ostream& operator<<(std::ostream& stream, const AssociationKind& kin
     return stream << kind.element;
 }
 
-/** Returns a data file with records of these identifiers. */
+/** Returns the content of a data file with records that have these identifiers. */
 std::string recordFile(const AssociationKind& kind, const std::vector<std::string>& identifiers);
 
-/** Three computers with names, "alpha", "beta" and "gamma". */
+/** Nodes of three computers, named "alpha", "beta" and "gamma". */
 extern const char* const threeComputers;
 
-/** @name Identifiers of their records: string forms of their node paths */
+/** @name Identifiers of the computers' records: string forms of the computers' node paths */
 ///@{
 constexpr const char* ofAlpha = "/system/computer";
 constexpr const char* ofBeta = "/system/second%5Fcomputer%202";  ///< of "/system/second_computer 2"

@@ -163,7 +163,7 @@ TEST_P(AssociationListTest, GetInstanceIsNotSupported) {
     setComputers({"alpha"});
     const ObjectPath existing = names().paths().at(0);
     EXPECT_THAT(provider().getInstance(existing), isRefused(CMPI_RC_ERR_NOT_SUPPORTED));
-    EXPECT_EQ(upCalls(), 1) << "only that of the enumeration";
+    EXPECT_EQ(upCalls(), 1) << "only the call of the enumeration";
 }
 
 TEST_P(AssociationListTest, AssociationsCannotBeCreatedModifiedOrDeleted) {

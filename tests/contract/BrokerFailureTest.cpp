@@ -114,7 +114,7 @@ TEST_P(BrokerFailureTest, ADateThatTheBrokerCannotCreateIsNull) {
     }
 }
 
-TEST_P(BrokerFailureTest, AKeyThatCannotBeReadSelectsNothingSoDeletionFails) {
+TEST_P(BrokerFailureTest, AKeyThatCannotBeReadIsIgnoredSoDeletionFails) {
     createAll({"A", "B"});
     broker.failEvery("CMPIObjectPathFT.getKey", CMPI_RC_ERR_NOT_FOUND);
     EXPECT_THAT(identifiersOf(get("B").instances()), ElementsAre("A", "B"));
@@ -141,7 +141,8 @@ TEST_P(BrokerFailureTest, AFailureOfReturnDoneIsIgnored) {
 
 INSTANTIATE_RECORD_TEST(BrokerFailureTest);
 
-/** Each call that a request makes fails, in two ways. Table and file stay consistent. */
+/** Each call that a request makes fails once with an error status and once with null. Memory and file stay consistent.
+ */
 class EveryCallFailsTest : public RecordTest {
 protected:
     using RequestCall = std::function<Outcome()>;
@@ -155,7 +156,7 @@ protected:
 
     /**
      * @param expected code of the request for the failing call
-     * @param maximumDone maximum number of calls of returnDone
+     * @param maximumDone maximum number of calls to returnDone
      * @param after called after each request, to check and restore the state
      */
     void failInTurn(const RequestCall& request, const ExpectedCode& expected, const std::function<void()>& after,
@@ -191,10 +192,10 @@ protected:
         EXPECT_LE(outcome.doneCount, maximumDone);
     }
 
-    /** For operations that take the class from the path: the first two calls read it. */
+    /** Code for operations that take the class from the path. The first two calls read the class. */
     static CMPIrc byClass(std::size_t index, bool) { return index < 2 ? CMPI_RC_ERR_INVALID_CLASS : CMPI_RC_OK; }
 
-    /** For creation: the next two calls read the namespace, and the request returns their code. */
+    /** Code for creation. The next two calls read the namespace, and the request returns their code. */
     static CMPIrc byClassAndNamespace(std::size_t index, bool isSilent) {
         return index == 2 || index == 3 ? (isSilent ? CMPI_RC_OK : brokerCode) : byClass(index, isSilent);
     }
@@ -207,7 +208,7 @@ protected:
         EXPECT_EQ(data(), dataOfNew(expected));
     }
 
-    /** Expects the same after the library is loaded again. */
+    /** Expects these records after the library is loaded again. */
     void expectRecordsAfterReload(const std::vector<std::string>& expected) {
         unload();
         expectRecords(expected);

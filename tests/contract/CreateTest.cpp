@@ -23,7 +23,7 @@ protected:
         return provider().createInstance(path, clientInstance(path, {}));
     }
 
-    /** Creates a record by a path whose key has these data. */
+    /** Creates a record with a path whose key has these data. */
     Outcome createByData(const CMPIData& data, CMPIrc rc = CMPI_RC_OK) {
         broker.answerData(getKey, "InstanceID", data, rc);
         Outcome outcome = create("ignored");
@@ -58,7 +58,7 @@ protected:
         EXPECT_EQ(data(), dataOfNew({"A"}));
     }
 
-    /** Returns the number of the getCharPtr call for the namespace within a creation. */
+    /** Returns which getCharPtr call of a creation reads the namespace, counted from 1. */
     int callForNamespace() {
         EXPECT_THAT(create("probe"), isOk(1));
         EXPECT_THAT(remove("probe"), isOk(0));
@@ -79,7 +79,7 @@ protected:
     }
 };
 
-TEST_P(CreateTest, ReturnsTheNewInstanceAndOneDoneButNoPath) {
+TEST_P(CreateTest, ReturnsTheNewInstanceButNoPathAndCallsReturnDoneOnce) {
     const Outcome outcome = create("A");
     EXPECT_THAT(outcome, isOk(1));
     ASSERT_THAT(outcome.events, SizeIs(2));
@@ -173,7 +173,7 @@ TEST_P(CreateTest, AKeyThatCannotBeReadCreatesNothing) {
 TEST_P(CreateTest, AnEmptyIdentifierCreatesARecord) {
     EXPECT_THAT(identifiersOf(create("").instances()), ElementsAre(""));
     EXPECT_THAT(identifiers(), ElementsAre(""));
-    EXPECT_EQ(data(), dataOfNew({""})) << "an empty line";
+    EXPECT_EQ(data(), dataOfNew({""})) << "the identifier is an empty line";
 }
 
 TEST_P(CreateTest, TheNewInstanceHasTheNamespaceOfThePath) {

@@ -44,7 +44,7 @@ TEST_P(DataDirectoryTest, ChangesToAFileThatCannotBeOpenedStayInMemory) {
     EXPECT_THAT(loggedFailures(), IsEmpty()) << "reading needs no file";
 }
 
-TEST_P(DataDirectoryTest, TheNextSuccessfulChangeWritesEverything) {
+TEST_P(DataDirectoryTest, TheNextSuccessfulChangeWritesAllRecords) {
     blockData(kind().dataFile);
     create("A");
     create("B");

@@ -5,7 +5,7 @@
 #include "RecordFixture.h"
 #include "support/Umask.h"
 
-// Content of the record files, byte for byte, and reading it after a restart.
+// Content of the record files, byte for byte, and the records that are read from it after a restart.
 
 namespace contract {
 namespace {
@@ -21,7 +21,7 @@ constexpr const char* noDate = "00000000000000.000000-000";
 
 class DataFileTest : public RecordTest {
 protected:
-    /** Returns a file with one record "A" with these two lines after its identifier and default values otherwise. */
+    /** Returns a file with one record: its identifier, these two lines, and default values in the other lines. */
     std::string oneRecord(const std::string& textLine, const std::string& dateLine,
                           const std::string& identifier = "A") {
         const std::string defaults = kind().defaultFields;
@@ -29,7 +29,7 @@ protected:
                defaults.substr(std::string("*\n").size() + std::string(noDate).size() + 1);
     }
 
-    /** Returns the value of the string property after a restart. */
+    /** Sets the string property of record "A". Returns its value after a restart. */
     std::string afterRestart(const std::string& sent) {
         modify("A", {named(kind().textProperty, text(sent))});
         unload();
@@ -94,7 +94,7 @@ TEST_P(DataFileTest, ARecordHasAFixedNumberOfLines) {
     EXPECT_EQ(content.back(), '\n');
 }
 
-TEST_P(DataFileTest, ARestartKeepsTheOrderOfTheRecordsWithoutDeletedOnes) {
+TEST_P(DataFileTest, ARestartKeepsTheOrderOfTheRecordsAndOmitsDeletedRecords) {
     createAll({"C", "A", "B", "D"});
     remove("A");
     createAll({"A"});
@@ -124,7 +124,7 @@ TEST_P(DataFileTest, AnEmptyIdentifierShiftsTheFieldsOfItsRecord) {
     EXPECT_THAT(identifiers(), ElementsAre("the text"));
 }
 
-TEST_P(DataFileTest, AFileThatIsShorterThanItsCountRepeatsTheLastRecord) {
+TEST_P(DataFileTest, AFileWithFewerRecordsThanItsCountRepeatsTheLastRecord) {
     writeData(kind().dataFile, "3\n" + dataOfNew({"A"}).substr(2));
     EXPECT_THAT(identifiers(), ElementsAre("A", "A", "A"));
     EXPECT_THAT(loggedFailures(), IsEmpty());
@@ -190,7 +190,7 @@ TEST_P(DataFileTest, NumbersWithAPlusSignAreAccepted) {
     EXPECT_EQ(data(), dataOfNew({"A", "B", "N"}));
 }
 
-TEST_P(DataFileTest, ANewFileHasTheModeOfTheUmaskAndKeepsIt) {
+TEST_P(DataFileTest, ANewFileHasTheModeThatTheUmaskPermitsAndARewriteKeepsTheMode) {
     const std::filesystem::path file = dataFile(kind().dataFile);
     const auto modeOf = [&] { return static_cast<unsigned int>(std::filesystem::status(file).permissions()); };
     for (const auto& [mask, mode] : {std::pair(mode_t{0}, 0666U), std::pair(mode_t{027}, 0640U)}) {

@@ -13,7 +13,7 @@ constexpr CMPIrc ok = CMPI_RC_OK;
 constexpr CMPIrc invalidClass = CMPI_RC_ERR_INVALID_CLASS;
 constexpr CMPIrc notSupported = CMPI_RC_ERR_NOT_SUPPORTED;
 
-/** Expected status of an operation and number of calls of returnDone. */
+/** Expected status of an operation and number of calls to returnDone. */
 struct Answer {
     CMPIrc rc;
     int doneCount;
@@ -24,16 +24,16 @@ constexpr Answer servedInSilence{ok, 0};
 constexpr Answer refused{invalidClass, 0};
 constexpr Answer unsupported{notSupported, 0};
 
-/** A class and the expected response of each operation if it has no records. */
+/** A class and the expected response of each operation if the class has no records. */
 struct DispatchRow {
-    std::vector<const char*> names;  ///< spellings of the class name; null for none
+    std::vector<const char*> names;  ///< spellings of the class name; null if the path has no class name
     Answer enumerateInstanceNames;
     Answer enumerateInstances;
     Answer getInstance;
     Answer createInstance;
     Answer modifyInstance;
     Answer deleteInstance;
-    Answer associators;  ///< by the name of the association class; AssociatorNames likewise
+    Answer associators;  ///< Associators and AssociatorNames with this association class
 };
 
 // clang-format off
@@ -62,7 +62,7 @@ std::string shownName(const char* name) {
 
 class DispatchTest : public ProviderTest {
 protected:
-    /** One computer system, so that association classes are not empty. */
+    /** Serves one computer system, without which requests for association classes fail. */
     DispatchTest() {
         broker.serve("VELKO_ComputerSystem", {clientInstance(computerPath(), {})});
         provider();
@@ -166,7 +166,7 @@ TEST_F(DispatchTest, QueriesAreNotSupportedForAnyClass) {
     EXPECT_THAT(broker.calls(), IsEmpty());
 }
 
-TEST_F(DispatchTest, CleanupSucceedsAndChangesNothing) {
+TEST_F(DispatchTest, CleanupSucceedsWithoutCallingTheBroker) {
     for (const bool terminating : {false, true}) {
         EXPECT_THAT(provider().cleanupInstanceMI(terminating), isOk(0));
         EXPECT_THAT(provider().cleanupAssociationMI(terminating), isOk(0));
@@ -186,8 +186,8 @@ TEST_F(DispatchTest, OperationsWithAFixedStatusNeedNoArguments) {
 }
 
 /**
- * Returns function, level and message of the records of the log channel; the message without its part from the line
- * number on.
+ * Returns the function, level and message of each record of the log channel. Omits the part of the message from the
+ * line number on.
  */
 std::vector<std::string> logLines() {
     std::vector<std::string> lines;
@@ -217,7 +217,7 @@ TEST_F(DispatchTest, OperationsWithAFixedStatusLogOneLineEach) {
     EXPECT_EQ(logged([&] { provider().referenceNames(path, {}); }), method("LeaseAndWarranty_ReferenceNames"));
 }
 
-/** A class and its number. */
+/** A class and its logged number. */
 struct ClassIdCase {
     const char* className;
     const char* classId;

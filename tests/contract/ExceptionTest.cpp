@@ -55,7 +55,7 @@ protected:
             alter, allPath());
     }
 
-    /** Creates a record with such a result. */
+    /** Creates a record with a result that has replaced functions. */
     Outcome createInto(const std::string& instanceId, const Alter& alter) {
         return call(
             [&](CMPIInstanceMI* interface, const CMPIContext* context, const CMPIResult* result,
@@ -151,7 +151,7 @@ protected:
     static void throwNumber(CMPIResultFT& table) { throwNumberFrom(table.returnInstance); }
 };
 
-TEST_P(ExceptionTest, AStandardExceptionEndsTheRequestSuccessfullyWithoutDone) {
+TEST_P(ExceptionTest, AStandardExceptionEndsTheRequestSuccessfullyWithoutACallToReturnDone) {
     createAll({"A", "B"});
     const Outcome outcome = enumerateInto(throwError);
     EXPECT_THAT(outcome, isOk(0));
@@ -221,7 +221,7 @@ TEST_P(ExceptionTest, ExceptionsFromTheBrokersFactoryFunctionsAreCaught) {
     EXPECT_THAT(remove("A"), isOk(0));
     provider().createInstanceMI(broker.handle(), nullptr);
     EXPECT_THAT(caughtFailures(), ElementsAre(thrownMessage, thrownMessage, thrownMessage));
-    EXPECT_THAT(identifiers(), ElementsAre("A")) << "the deletion reads the record before it removes it";
+    EXPECT_THAT(identifiers(), ElementsAre("A")) << "the deletion reads the record before removing it";
 }
 
 TEST_P(ExceptionTest, ExceptionsFromTheRequestsPathAreCaught) {
@@ -254,7 +254,7 @@ TEST_P(ExceptionTest, ExceptionsFromClassNameAndNamespaceAreCaughtInEveryRequest
     EXPECT_EQ(data(), dataOfNew({"A"}));
 }
 
-TEST_P(ExceptionTest, AStatusOfTheNamespaceBeforeAnExceptionIsReturned) {
+TEST_P(ExceptionTest, ANamespaceStatusThatIsSetBeforeAnExceptionIsReturned) {
     CMPIInstanceMI* interface = provider().instanceMI();
     const Outcome outcome = provider().call([&](auto& scope, const CMPIContext* context, const CMPIResult* result) {
         Altered<CMPIObjectPath> altered(scope.objectPath(path("A")));
@@ -317,12 +317,12 @@ TEST_P(ExceptionTest, AFailedRewriteDuringUnwindingIsLoggedAndTheFirstExceptionP
     EXPECT_THAT(identifiers(), ElementsAre("A"));
 }
 
-TEST_P(ExceptionTest, ANonstandardExceptionLeavesTheEntryPoint) {
+TEST_P(ExceptionTest, ANonstandardExceptionPropagatesFromTheEntryPoint) {
     EXPECT_EQ(thrownNumber([&] { createDirectly("A", throwNumber); }), 42);
     EXPECT_THAT(loggedFailures(), IsEmpty());
     EXPECT_THAT(functionsLogged(), AllOf(Contains("markProviderEntry"), Not(Contains("markProviderExit"))));
-    EXPECT_EQ(data(), dataOfNew({"A"})) << "written while the exception leaves";
-    EXPECT_THAT(identifiers(), ElementsAre("A")) << "the provider continues";
+    EXPECT_EQ(data(), dataOfNew({"A"})) << "the record is written while the exception propagates";
+    EXPECT_THAT(identifiers(), ElementsAre("A")) << "the provider continues to serve requests";
     createAll({"B"});
     EXPECT_THAT(identifiers(), ElementsAre("A", "B"));
 }

@@ -5,7 +5,7 @@
 #include "RecordFixture.h"
 #include "support/Files.h"
 
-// Malicious strings of clients in memory, in the file and in the log.
+// Malicious strings from clients in memory, in the file and in the log.
 
 namespace contract {
 namespace {
@@ -17,7 +17,7 @@ using testsupport::named;
 using testsupport::RecordModel;
 using testsupport::text;
 
-/** Returns a string of all special characters, repeated up to a length. */
+/** Returns a string of this length, which repeats all special characters. */
 std::string longString(std::size_t length) {
     std::string all;
     while (all.size() < length) {
@@ -83,7 +83,7 @@ std::vector<std::string> shapeOfLog() {
     return shapes;
 }
 
-/** Returns the lines of the log file that are not valid records: eight fields of printable characters. */
+/** Returns the invalid lines of the log file. A valid line has eight fields of printable characters. */
 std::vector<std::string> malformedLogLines() {
     std::vector<std::string> malformed;
     std::ifstream stream(agentEnvironment::logFile(), std::ios::binary);
@@ -159,7 +159,7 @@ protected:
         expectRecords();
     }
 
-    /** Expects that memory matches the model after the file was read. */
+    /** Restarts, and expects that memory matches the model, which is read from the same file. */
     void expectAgreementAfterRestart() {
         restartBoth();
         const std::string before = data().value_or("");
@@ -174,7 +174,10 @@ protected:
         model.records.clear();
     }
 
-    /** Returns the log of creating, modifying and deleting a record with that identifier and value. */
+    /**
+     * Returns the log records, without messages, of creating, modifying and deleting a record with this identifier and
+     * value.
+     */
     std::vector<std::string> logOfLife(const std::string& instanceId, const std::string& value) {
         restartEmpty();
         create(instanceId);
@@ -238,7 +241,7 @@ TEST_P(HostileTextTest, LogRecordsCannotBeForged) {
     }
 }
 
-TEST_P(HostileTextTest, ADuplicateIsLoggedTheSameForAnyIdentifier) {
+TEST_P(HostileTextTest, ADuplicateIsLoggedInTheSameWayForAnyIdentifier) {
     for (const std::string& hostile : hostileStrings()) {
         restartEmpty();
         create(hostile);
@@ -258,8 +261,8 @@ TEST_P(HostileTextTest, ClassNamesCannotForgeLogRecords) {
     }
 }
 
-/** Random requests, each of which may damage the file for the next load. */
-TEST_P(HostileTextTest, AnySequenceOfRequestsAndRestartsMatchesTheModel) {
+/** Random requests, each of which can damage the file for the next load. */
+TEST_P(HostileTextTest, RandomRequestsAndRestartsMatchTheModel) {
     std::mt19937 random(20240506);
     const auto below = [&](std::size_t limit) { return static_cast<std::size_t>(random() % limit); };
     const auto word = [&] {

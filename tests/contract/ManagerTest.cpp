@@ -2,7 +2,7 @@
 
 #include "RecordFixture.h"
 
-// Behaviour of brokers and values of existing object managers.
+// Tests the provider with brokers and values like those of existing object managers.
 
 namespace contract {
 namespace {
@@ -15,7 +15,7 @@ using testsupport::named;
 using testsupport::text;
 using testsupport::uint32;
 
-/** Makes each request once and expects the results that every broker must yield. */
+/** Makes requests of each kind, and expects the same results with every broker. */
 class ManagerTest : public RecordTest {
 protected:
     void expectAllRequestsServed() {
@@ -66,7 +66,7 @@ TEST_P(ManagerTest, AMissingMemoryTableIsAccepted) {
     expectAllRequestsServed();
 }
 
-TEST_P(ManagerTest, NoBrokerServicesExceptObjectCreationAreUsed) {
+TEST_P(ManagerTest, MemoryThreadReleaseAndCloneFunctionsOfTheBrokerAreNotUsed) {
     expectAllRequestsServed();
     for (const std::string& function : broker.functions()) {
         EXPECT_NE(function.substr(0, function.find('.')), "CMPIBrokerMemFT") << function;
@@ -76,7 +76,7 @@ TEST_P(ManagerTest, NoBrokerServicesExceptObjectCreationAreUsed) {
     }
 }
 
-TEST_P(ManagerTest, AnUnsetStringMayPointToAStringWithoutCharacters) {
+TEST_P(ManagerTest, AStringInTheNullStateIsNotAValueWhateverItPointsTo) {
     createAll({"A"});
     modify("A", {named(kind().textProperty, text("kept"))});
     const auto kept = recordOf("A");
@@ -89,7 +89,7 @@ TEST_P(ManagerTest, AnUnsetStringMayPointToAStringWithoutCharacters) {
     }
 }
 
-TEST_P(ManagerTest, AStringWithoutCharactersIsNoValueInAnyState) {
+TEST_P(ManagerTest, AStringWithoutCharactersIsNotAValueEvenInTheGoodState) {
     createAll({"A"});
     modify("A", {named(kind().textProperty, text("kept"))});
     const auto kept = recordOf("A");
@@ -102,12 +102,12 @@ TEST_P(ManagerTest, AStringWithoutCharactersIsNoValueInAnyState) {
     }
 }
 
-TEST_P(ManagerTest, ADatetimeThatIsANullPointerIsNoValue) {
+TEST_P(ManagerTest, ADatetimeThatIsANullPointerIsNotAValue) {
     createAll({"A"});
     EXPECT_EQ(afterReading(kind().dateProperty, dataOf(CMPI_dateTime, CMPI_goodValue)), kind().shownRecord("A"));
 }
 
-TEST_P(ManagerTest, ANumberInTheStateNullOrNotFoundIsNoValue) {
+TEST_P(ManagerTest, ANumberInTheStateNullNotFoundOrBadIsNotAValue) {
     createAll({"A"});
     for (const CMPIValueState state :
          {static_cast<CMPIValueState>(CMPI_nullValue), static_cast<CMPIValueState>(CMPI_notFound),
@@ -139,7 +139,7 @@ TEST_P(ManagerTest, AKeyThatIsCountedButCannotBeReadCreatesNothing) {
     EXPECT_THAT(identifiers(), IsEmpty());
 }
 
-TEST_P(ManagerTest, AKeyWithoutCharactersSelectsNothing) {
+TEST_P(ManagerTest, AKeyWithoutCharactersIsIgnoredSoDeletionFails) {
     createAll({"A", "B"});
     CMPIData key = dataOf(CMPI_string, CMPI_keyValue);
     for (CMPIString* string : {static_cast<CMPIString*>(nullptr), broker.stringWithoutCharacters()}) {

@@ -21,7 +21,7 @@ constexpr const char* date = "20240506070809.123456+120";
 
 class ModifyTest : public RecordTest {
 protected:
-    /** Returns the string, number and date property of a record in the format of shown(). */
+    /** Return the string, number or date property of a record in the format of shown(). */
     std::string shownText(const std::string& value) const {
         return std::string(kind().textProperty) + "=\"" + value + '"';
     }
@@ -49,7 +49,7 @@ protected:
     }
 };
 
-TEST_P(ModifyTest, ReturnsNothingAndNoDone) {
+TEST_P(ModifyTest, ReturnsNothingAndDoesNotCallReturnDone) {
     createAll({"A"});
     const Outcome outcome = modify("A", {named(kind().textProperty, text("changed"))});
     EXPECT_THAT(outcome, isOk(0));
@@ -104,7 +104,7 @@ TEST_P(ModifyTest, ValuesOfAnotherTypeChangeNothing) {
     EXPECT_THAT(loggedFailures(), IsEmpty());
 }
 
-TEST_P(ModifyTest, NumbersOfAnyIntegerTypeAreAcceptedIfTheyFit) {
+TEST_P(ModifyTest, NumbersOfAnyIntegerTypeAreAcceptedIfTheyAreInRange) {
     createAll({"A"});
     const auto withNumber = [&](unsigned int number) { return kind().shownRecord("A", {shownNumber(number)}); };
     constexpr std::uint64_t largest = std::numeric_limits<std::uint32_t>::max();
@@ -143,7 +143,7 @@ TEST_P(ModifyTest, ReadOnlyPropertiesAreIgnored) {
     EXPECT_EQ(recordOf("A"), kind().shownRecord("A"));
 }
 
-TEST_P(ModifyTest, OtherPropertiesAreSetBesideReadOnlyOnes) {
+TEST_P(ModifyTest, WritablePropertiesAreSetEvenIfReadOnlyPropertiesAreSent) {
     createAll({"A"});
     modify("A",
            {named("Caption", text("Z")), named(kind().numberProperty, uint32(24)), named("InstanceID", text("Z"))});
@@ -163,7 +163,7 @@ TEST_P(ModifyTest, PropertyListsAreNotApplied) {
     EXPECT_EQ(recordOf("A"), kind().shownRecord("A", {shownText("new"), shownNumber(8)}));
 }
 
-TEST_P(ModifyTest, TheInstancesOwnPathDoesNotSelectTheRecord) {
+TEST_P(ModifyTest, ThePathInsideTheInstanceDoesNotSelectTheRecord) {
     createAll({"A", "B"});
     provider().modifyInstance(path("A"), clientInstance(path("B"), {named(kind().numberProperty, uint32(7))}));
     EXPECT_EQ(recordOf("A"), kind().shownRecord("A", {shownNumber(7)}));
@@ -197,7 +197,7 @@ TEST_P(ModifyTest, AnUnknownRecordIsNotLoggedIfNothingIsSet) {
     EXPECT_THAT(loggedFailures(), IsEmpty());
 }
 
-TEST_P(ModifyTest, AnEmptyTableHasNothingToChange) {
+TEST_P(ModifyTest, AModificationOfAnEmptyTableIsOnlyLogged) {
     const Instance sent = clientInstance(allPath(), {named(kind().textProperty, text("x"))});
     EXPECT_THAT(provider().modifyInstance(allPath(), sent), isOk(0));
     EXPECT_THAT(caughtFailures(), ElementsAre(kind().notAvailable));
@@ -252,7 +252,7 @@ TEST_F(ProviderTest, EveryModifiablePropertyOfALeaseIsWritten) {
     EXPECT_EQ(shown(provider().getInstance(path).instances().at(0).properties), expected);
 }
 
-TEST_F(ProviderTest, AWarrantysDateAndDurationAreStoredFromAModificationThatAlsoSendsACaption) {
+TEST_F(ProviderTest, AModificationThatAlsoSendsACaptionStoresAWarrantysDateAndDuration) {
     const ObjectPath path = keyedPath("VELKO_Warranty", "W");
     provider().createInstance(path, clientInstance(path, {}));
     EXPECT_THAT(provider().modifyInstance(

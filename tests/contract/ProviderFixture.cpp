@@ -27,7 +27,7 @@ std::string identifierOf(const std::vector<NamedValue>& values) {
     return testsupport::stringOf(values, "InstanceID").value_or("(none)");
 }
 
-/** Returns the message of a MESSAGE record; none for other records. */
+/** Returns the message of a MESSAGE record; nullopt for other records. */
 std::optional<std::string> messageOf(const LogRecord& record) {
     static const std::regex message(R"(MESSAGE \[File: [^,]*, Line: [0-9]+\]: ([^]*))");
     std::smatch parts;

@@ -54,11 +54,11 @@ std::vector<LogRecord> logOf(const std::string& channel = "log");
 /** Returns the messages of all MESSAGE records at level 3000, which report failures, in order. */
 std::vector<std::string> loggedFailures(const std::string& channel = "log");
 
-/** Returns those messages that the entry points logged: exceptions of the adapters. */
+/** Returns the messages of failures that the entry points logged: exceptions that they caught. */
 std::vector<std::string> caughtFailures();
 ///@}
 
-/** Matches a successful request: status OK without a message, and this number of calls of returnDone. */
+/** Matches a successful request: status OK without a message, and this number of calls to returnDone. */
 testing::Matcher<const Outcome&> isOk(int doneCount);
 
 /** Matches a request with this status code, no results and no message. */
@@ -67,9 +67,9 @@ testing::Matcher<const Outcome&> isRefused(CMPIrc rc);
 /**
  * The provider library with a new agent and a new data directory for each test.
  *
- * The first call of provider() loads the library and creates its interfaces, so the provider loads the files that the
- * test wrote before. The agent's libraries are loaded and unloaded with it. At the end, the fixture unloads the
- * library, which must then no longer be in the process.
+ * The first call to provider() loads the library, so that the provider loads the files that the test wrote before. The
+ * agent's libraries are loaded and unloaded together with the provider library. At the end, the fixture unloads the
+ * library and expects that it is no longer loaded.
  */
 class ProviderTest : public testing::Test {
 protected:
@@ -80,8 +80,8 @@ protected:
     testsupport::ProviderLibrary& provider();
 
     /**
-     * Unloads the library, which must then no longer be in the process. The next provider() loads it and its files
-     * again.
+     * Unloads the library and expects that it is no longer loaded. The next call to provider() loads the library and
+     * its files again.
      */
     void unload();
 
@@ -93,13 +93,13 @@ protected:
     static std::filesystem::path dataFile(const std::string& name);
     static void writeData(const std::string& name, const std::string& content);
 
-    /** Returns the content of a file; none if it does not exist. */
+    /** Returns the content of a file; nullopt if the file does not exist. */
     static std::optional<std::string> readData(const std::string& name);
 
-    /** Replaces the file by a directory, so that even the superuser cannot open it. */
+    /** Replaces the file with a directory, so that even the superuser cannot open the file. */
     static void blockData(const std::string& name);
 
-    /** Removes whatever is at the file's path. */
+    /** Removes the file or directory at the file's path. */
     static void freeData(const std::string& name);
     ///@}
 

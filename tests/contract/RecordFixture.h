@@ -65,10 +65,10 @@ protected:
     /** Returns the identifiers of all records in the order of EnumerateInstanceNames. */
     std::vector<std::string> identifiers();
 
-    /** Returns the properties of a record in the format of shown(); empty if it does not exist. */
+    /** Returns the properties of a record in the format of shown(); empty if the record does not exist. */
     std::vector<std::string> recordOf(const std::string& instanceId);
 
-    /** Returns the content of the class's data file; none if it does not exist. */
+    /** Returns the content of the class's data file; nullopt if the file does not exist. */
     std::optional<std::string> data() const { return readData(kind().dataFile); }
 
     /** Returns the content of a data file with these new records. */

@@ -20,7 +20,7 @@ protected:
     }
 };
 
-TEST_P(RecordRequestTest, AMissingDataFileMeansNoRecordsAndReadingDoesNotCreateIt) {
+TEST_P(RecordRequestTest, AMissingDataFileMeansNoRecordsAndReadingDoesNotCreateTheFile) {
     EXPECT_THAT(provider().enumerateInstances(allPath()), isOk(1));
     EXPECT_THAT(identifiers(), IsEmpty());
     EXPECT_THAT(recordOf("1"), IsEmpty());
@@ -34,7 +34,7 @@ TEST_P(RecordRequestTest, EnumerationReturnsRecordsInTheOrderOfCreation) {
     const Outcome outcome = provider().enumerateInstances(allPath());
     EXPECT_THAT(outcome, isOk(1));
     EXPECT_THAT(identifiersOf(outcome.instances()), ElementsAre("C", "A", "B"));
-    EXPECT_TRUE(std::holds_alternative<cimhost::Done>(outcome.events.back())) << "done is last";
+    EXPECT_TRUE(std::holds_alternative<cimhost::Done>(outcome.events.back())) << "returnDone is called last";
 }
 
 TEST_P(RecordRequestTest, PathsHaveTheClassTheRequestsNamespaceAndOneKey) {
@@ -54,7 +54,7 @@ TEST_P(RecordRequestTest, GetReturnsTheRecordWithAllPropertiesThatHaveAValue) {
     EXPECT_EQ(recordOf("B"), kind().shownRecord("B"));
 }
 
-TEST_P(RecordRequestTest, GetOfAnUnknownKeyReturnsNothingAndDone) {
+TEST_P(RecordRequestTest, GetOfAnUnknownKeyReturnsNothingAndCallsReturnDone) {
     createAll({"A"});
     const Outcome outcome = get("missing");
     EXPECT_THAT(outcome, isOk(1));
@@ -131,7 +131,7 @@ TEST_P(RecordRequestTest, TheNameOfTheKeyIsCaseInsensitive) {
     EXPECT_THAT(identifiersOf(provider().getInstance(folded).instances()), ElementsAre("B"));
 }
 
-TEST_P(RecordRequestTest, DeletionReturnsNothingAndNoDone) {
+TEST_P(RecordRequestTest, DeletionReturnsNothingAndDoesNotCallReturnDone) {
     createAll({"A", "B", "C"});
     const Outcome outcome = remove("B");
     EXPECT_THAT(outcome, isOk(0));
@@ -200,7 +200,7 @@ TEST_P(RecordRequestTest, ReadingDoesNotRewriteTheFile) {
     EXPECT_EQ(data(), "written by another program");
 }
 
-TEST_P(RecordRequestTest, AChangeOverwritesExternalChangesOfTheFile) {
+TEST_P(RecordRequestTest, AChangeOverwritesExternalChangesToTheFile) {
     createAll({"A"});
     writeData(kind().dataFile, dataOfNew({"X", "Y", "Z"}));
     EXPECT_THAT(identifiers(), ElementsAre("A"));
@@ -217,7 +217,7 @@ TEST_F(ProviderTest, LeasesAndWarrantiesShareNoData) {
     };
     EXPECT_EQ(create(lease).instances().size(), 1U);
     EXPECT_EQ(readData(warranty.dataFile), std::nullopt);
-    EXPECT_EQ(create(warranty).instances().size(), 1U) << "a lease and a warranty may have the same identifier";
+    EXPECT_EQ(create(warranty).instances().size(), 1U) << "a lease and a warranty can have the same identifier";
     EXPECT_THAT(provider().deleteInstance(keyedPath(lease.className, "same")), isOk(0));
     EXPECT_THAT(identifiersOf(provider().enumerateInstanceNames(classPath(warranty.className)).paths()),
                 ElementsAre("same"));

@@ -5,7 +5,7 @@
 #include <memory>
 #include <utility>
 
-// Broker objects of which tests replace single functions, for example by functions that throw.
+// Broker objects in which tests replace single functions, for example with functions that throw exceptions.
 
 namespace contract {
 
@@ -27,7 +27,7 @@ private:
     Handle object;
 };
 
-/** A copy of a broker with a separate table of creating functions. */
+/** A copy of a broker with a separate table of functions that create objects. */
 class AlteredBroker {
 public:
     explicit AlteredBroker(const CMPIBroker* original) : factories(*original->eft), broker(*original) {
@@ -44,7 +44,10 @@ private:
     CMPIBroker broker;
 };
 
-/** A function of any table that throws. Thrown must be constructible from a string, or be int. */
+/**
+ * Throwing functions with the signature of a table's function. error() throws a Thrown that is constructed from a
+ * string, number() an int.
+ */
 template <class Function>
 struct Throwing;
 
@@ -57,13 +60,13 @@ struct Throwing<Result (*)(Arguments...)> {
     static Result number(Arguments...) { throw 42; }
 };
 
-/** Replaces a slot of a table by a function that throws a standard exception. */
+/** Replaces a slot of a table with a function that throws a standard exception. */
 template <class Thrown, class Function>
 void throwFrom(Function& slot) {
     slot = &Throwing<Function>::template error<Thrown>;
 }
 
-/** Replaces a slot of a table by a function that throws the number 42. */
+/** Replaces a slot of a table with a function that throws the number 42. */
 template <class Function>
 void throwNumberFrom(Function& slot) {
     slot = &Throwing<Function>::number;

@@ -17,7 +17,7 @@ using testing::IsEmpty;
 constexpr const char* logger = "Tarvik.LeaseAndWarrantyProvider";
 constexpr const char* shortLogger = "Tarvik.LeaseWarrantyProvider";
 
-/** Returns whether entry and exit are logged at error level. */
+/** Returns whether the entry and exit of a record's function are logged at error level. */
 bool isRaised(const LogRecord& record) {
     static const std::map<std::string, std::set<std::string>> raised{
         {"CMPIComputerSystem.cpp", {"setObjectPath", "getCMPIInstance"}},
@@ -67,13 +67,13 @@ TEST_F(TranscriptPropertyTest, LevelsMatchTheKindOfRecord) {
         }
     });
     for (const std::string& message : flowMessages()) {
-        EXPECT_THAT(foundMessages, Contains(message)) << "no scenario contains it";
+        EXPECT_THAT(foundMessages, Contains(message)) << "no scenario logs this message";
     }
     EXPECT_THAT(foundMessages, Contains(loudMessage));
     EXPECT_EQ(foundRaised.size(), 18U) << "functions whose entry or exit is at error level";
 }
 
-TEST_F(TranscriptPropertyTest, TheDetailMessageIsWrittenOncePerOpen) {
+TEST_F(TranscriptPropertyTest, AFailureToOpenTheAssetFileIsLoggedOnceAtLevel6000) {
     for (const char* name : {"AssetIDDetails-enumerate-unreadable", "AssetIDDetails-modify-unwritable"}) {
         const auto records = logged(name);
         EXPECT_EQ(
@@ -168,7 +168,7 @@ TEST_F(TranscriptPropertyTest, AssociationsLogConstructionAndDestructionOfTheirP
             EXPECT_THAT(noted, ElementsAre(computer, element, "~" + adapter, "~" + element, "~" + computer));
         } else {
             EXPECT_THAT(noted, ElementsAre(computer, element, "~" + element, "~" + computer))
-                << "not constructed completely";
+                << "the adapter was not constructed completely";
         }
     });
 }

@@ -23,10 +23,10 @@ struct Line {
     std::string name{};  ///< of the function or variable
     std::string file{};
     int line = 0;
-    std::string value{};  ///< of the variable; the message; the parameter list
+    std::string value{};  ///< value of the variable, text of the message, or parameter list
 };
 
-/** Parses a message. Its kind is unknown unless the message has exactly one of the formats. */
+/** Parses a message. The kind is `unknown` unless the message has one of the formats. */
 Line lineOf(const std::string& text);
 
 /** Returns the records of one channel. */
@@ -35,7 +35,7 @@ std::vector<LogRecord> channel(const std::vector<LogRecord>& records, const char
 /** Checks every transcript, independently of its golden file. */
 class TranscriptPropertyTest : public TranscriptTest {
 protected:
-    /** Calls a check with the records of each scenario, both channels. */
+    /** Calls a check with the records of each scenario, which include both channels. */
     template <class Check>
     void forEachTranscript(Check check) {
         for (const Scenario& scenario : scenarios()) {
@@ -56,13 +56,13 @@ protected:
         });
     }
 
-    /** Returns the records of a scenario, which runs once per process. */
+    /** Returns the records of a scenario. Runs each scenario once per process. */
     const std::vector<LogRecord>& recordsOf(const Scenario& scenario);
 
     /** Returns the log channel's records of a scenario. */
     std::vector<LogRecord> logged(const std::string& scenarioName);
 
-    /** Returns the function and variable names of the records with that kind and source file. */
+    /** Returns the function or variable names of the records with this kind and source file. */
     std::vector<std::string> namesOf(const std::string& scenarioName, Line::Kind kind, const std::string& file);
 };
 

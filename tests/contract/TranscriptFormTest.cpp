@@ -44,7 +44,7 @@ TEST_F(TranscriptPropertyTest, EachMessageContainsTheFunctionFileAndLineOfItsRec
     });
 }
 
-TEST_F(TranscriptPropertyTest, FunctionNamesHaveNoClassParametersOrTemplateArguments) {
+TEST_F(TranscriptPropertyTest, FunctionNamesContainNoClassNameParametersOrTemplateArguments) {
     const std::regex plain("~?[A-Za-z_]+|operator(bool| bool|\\+\\+|<<|>>|=)");
     forEachRecord([&](const LogRecord& record, const Line&) {
         EXPECT_TRUE(std::regex_match(record.function, plain)) << record.function << " in " << record.file;
@@ -151,21 +151,21 @@ TEST_F(TranscriptPropertyTest, MarkersHaveTheFileAndLinesOfTheTraceHeader) {
     });
 }
 
-/** Functions that were entered and not left, outermost first. */
+/** Functions that were entered and not yet left, outermost first. */
 class OpenFunctions {
 public:
     void enter(const LogRecord& record, const Line& line) {
         open.push_back({line.file, line.name, record.line, false});
     }
 
-    /** Handles a failure, which may leave every open function. */
+    /** Handles a failure. Every open function can be left by the exception, without a log record. */
     void fail() {
         for (Function& each : open) {
             each.mayBeLeft = true;
         }
     }
 
-    /** Closes the innermost function with that name. Functions inside it must have been left by an exception. */
+    /** Closes the innermost function with this name. Functions inside it must have been left by an exception. */
     void exit(const Line& line) {
         while (!open.empty() && !(open.back().file == line.file && open.back().name == line.name)) {
             expectLeft(open.back());
@@ -193,7 +193,7 @@ private:
     std::vector<Function> open;
 };
 
-TEST_F(TranscriptPropertyTest, EntriesAndExitsNest) {
+TEST_F(TranscriptPropertyTest, EntriesAndExitsAreNested) {
     forEachTranscript([](const Scenario&, const std::vector<LogRecord>& records) {
         OpenFunctions functions;
         for (const LogRecord& record : channel(records, "log")) {

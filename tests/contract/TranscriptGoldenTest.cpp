@@ -13,7 +13,7 @@
 //
 // A line of a golden file is one record: channel, level, logger, function, file, line and message, separated by tabs.
 // Line numbers and addresses are masked, except the fixed lines of the marker records of a request. Set UPDATE_GOLDEN=1
-// in the environment to write the files instead of comparing.
+// in the environment to write the files instead of comparing them.
 
 namespace contract {
 namespace {
@@ -45,7 +45,7 @@ std::vector<std::string> linesOf(const std::string& content) {
     return lines;
 }
 
-/** Returns the first difference between two transcripts, for readers. */
+/** Describes the first difference between two transcripts. */
 std::string difference(const std::string& golden, const std::string& logged) {
     const auto expected = linesOf(golden);
     const auto actual = linesOf(logged);

@@ -17,7 +17,7 @@ constexpr const char* agentClass = "VELKO_OstrelAgent";
 constexpr const char* assetsClass = "VELKO_AssetIDDetails";
 constexpr const char* unknownClass = "VELKO_NoSuchClass";
 
-/** Returns all modifiable properties of a record and a read-only one. */
+/** Returns new values for all modifiable properties of a record and for a read-only property. */
 std::vector<NamedValue> changesOf(const AssociationKind& kind) {
     if (std::string(kind.element) == leases.element) {
         return {named("Caption", text("not changeable")),
@@ -42,7 +42,7 @@ Instance changed(const ObjectPath& path, std::vector<NamedValue> properties) {
     return clientInstance(path, std::move(properties));
 }
 
-/** Returns a scenario with loaded records "A" of one class. */
+/** Returns a scenario in which the record "A" of a class is loaded. */
 Scenario withRecord(const AssociationKind& kind, const std::string& action,
                     std::function<void(testsupport::ProviderLibrary&, const AssociationKind&)> act) {
     return {std::string(kind.element).substr(6) + "-" + action, [kind, act](TranscriptTest& test) {
@@ -51,7 +51,7 @@ Scenario withRecord(const AssociationKind& kind, const std::string& action,
             }};
 }
 
-/** Returns the same with a data file that can no longer be opened. */
+/** Returns such a scenario, in which the data file cannot be opened after loading. */
 Scenario unwritable(const AssociationKind& kind, const std::string& action,
                     std::function<void(testsupport::ProviderLibrary&, const AssociationKind&)> act) {
     return {std::string(kind.element).substr(6) + "-" + action + "-unwritable", [kind, act](TranscriptTest& test) {
@@ -114,7 +114,7 @@ std::vector<Scenario> ofRecords(const AssociationKind& kind) {
     };
 }
 
-/** Returns a scenario of an association with the records "/system/computer", the computer's own, and "B". */
+/** Returns a scenario of an association with the records "/system/computer", which belongs to the computer, and "B". */
 Scenario ofAssociation(const AssociationKind& kind, const std::string& action,
                        const std::vector<std::string>& computers,
                        std::function<void(Library&, const AssociationKind&)> act) {

@@ -12,7 +12,7 @@ namespace contract {
 
 class TranscriptTest;
 
-/** A client's actions whose log is compared. */
+/** Actions whose log records are compared with a golden file. */
 struct Scenario {
     std::string name;  ///< also the name of its golden file
     std::function<void(TranscriptTest&)> run;
@@ -29,7 +29,7 @@ const std::vector<Scenario>& scenarios();
 /** A provider whose log is recorded. */
 class TranscriptTest : public ProviderTest {
 public:
-    /** Runs a scenario and returns its records, both channels, in order. */
+    /** Runs a scenario. Returns its log records of both channels, in order. */
     std::vector<LogRecord> transcriptOf(const Scenario& scenario);
 
     /** @name Functions of scenarios */
@@ -39,7 +39,7 @@ public:
     using ProviderTest::unload;
     using ProviderTest::writeData;
 
-    /** Loads the provider after a scenario's preparations. Drops the records logged so far. */
+    /** Loads the provider after a scenario's preparations. Discards the records logged so far. */
     testsupport::ProviderLibrary& begin();
 
     /** Sets the computer systems of the object manager. */

@@ -8,7 +8,7 @@
 #include "TranscriptFixture.h"
 #include "support/Files.h"
 
-// The sources that the line numbers of records belong to, as documented in docs/log-records.md.
+// Checks that the line numbers of records belong to the sources that docs/log-records.md documents.
 
 namespace contract {
 namespace {
@@ -70,7 +70,7 @@ fs::path sourceNamed(const std::string& file) {
     return {};
 }
 
-/** Returns the documented sources for a function: more than one if the type of a value determines it. */
+/** Returns the documented sources for a function: more than one if the source depends on the type of a value. */
 std::vector<fs::path> documentedSources(const std::vector<SourceRow>& rows, const LogRecord& record) {
     std::vector<fs::path> named;
     std::vector<fs::path> others;

@@ -10,12 +10,12 @@
 #include "RecordFixture.h"
 #include "support/TemporaryDirectory.h"
 
-// System calls of a rewrite per line of the record file. Records all C library functions that write to or use an open
-// file.
+// Checks the number of system calls that a rewrite makes per line of the record file. Records calls to all C library
+// functions that write to or use an open file.
 
 namespace {
 
-/** Records the calls for a file while it exists. Only one instance may exist. */
+/** Records the calls for a file during the lifetime of this object. Only one instance may exist at a time. */
 class Watch {
 public:
     explicit Watch(const std::filesystem::path& itsFile) : file(std::filesystem::canonical(itsFile).string()) {
@@ -25,7 +25,7 @@ public:
     Watch(const Watch&) = delete;
     Watch& operator=(const Watch&) = delete;
 
-    /** Returns the watch of the descriptor's file; null for none. */
+    /** Returns the watch of the descriptor's file; null if there is none. */
     static Watch* over(int descriptor) {
         if (only == nullptr) {
             return nullptr;
@@ -45,7 +45,7 @@ private:
 
 }  // namespace
 
-// Interpose the functions of the C library for all libraries of this process.
+// These functions replace those of the C library for all libraries of this process.
 #pragma GCC visibility push(default)
 extern "C" {
 
@@ -68,8 +68,8 @@ ssize_t writev(int descriptor, const struct iovec* parts, int count) {
 }
 
 /**
- * Defines a replacement of a C library function for open files, which counts calls and makes the system call with that
- * number. It has a different name in this source, so that it need not match the C library's declaration.
+ * Defines a replacement of a C library function for open files, which counts calls and makes the system call with this
+ * number. The replacement has a different name in this source, so that it need not match the C library's declaration.
  */
 #define COUNTED(name, number)                                                                             \
     long counted_##name(int descriptor, long first, long second, long third, long fourth) __asm__(#name); \
@@ -149,7 +149,7 @@ TEST_P(WriteCallsTest, ARewriteMakesOneWriteCallPerLine) {
     EXPECT_EQ(linesOfFile().size(), 1 + 22 * kind().linesOfRecord);
 }
 
-TEST(WriteCallsWatchTest, RecordsOtherCallsThanWriting) {
+TEST(WriteCallsWatchTest, RecordsCallsOtherThanWrite) {
     const testsupport::TemporaryDirectory directory;
     const std::filesystem::path path = directory.path() / "file";
     const int file = open(path.c_str(), O_RDWR | O_CREAT | O_CLOEXEC, 0600);

@@ -2,7 +2,7 @@
 
 #include "GateFixture.h"
 
-// The associations of computers with their leases and warranties. Six operations find them and must agree.
+// The associations of computers with their leases and warranties. All requests that return them must agree.
 
 namespace gatetest {
 namespace {
@@ -19,7 +19,7 @@ constexpr const char* firstLease = "root/cimv2:VELKO_Lease.InstanceID=\"/system/
 constexpr const char* secondLease = "root/cimv2:VELKO_Lease.InstanceID=\"/system/computer2\"";
 constexpr const char* firstWarranty = "root/cimv2:VELKO_Warranty.InstanceID=\"/system/computer1\"";
 
-/** alpha has a lease and a warranty, beta a lease; one lease belongs to no computer. */
+/** alpha has a lease and a warranty; beta has a lease. Another lease belongs to no computer. */
 class AssociationTest : public GateTest {
 protected:
     AssociationTest() {
@@ -67,7 +67,7 @@ protected:
     }
 };
 
-TEST_F(AssociationTest, FindsComputersWhateverTheStateOfTheEnumerationElements) {
+TEST_F(AssociationTest, FindsComputersRegardlessOfTheStateOfEnumeratedElements) {
     for (const int state : {CMPI_goodValue, CMPI_nullValue, CMPI_keyValue, CMPI_notFound, CMPI_badValue}) {
         broker.answerState("CMPIEnumerationFT.getNext", static_cast<CMPIValueState>(state));
         EXPECT_THAT(names(computerPath("alpha")), UnorderedElementsAre(firstLease, firstWarranty));
@@ -83,7 +83,7 @@ TEST_F(AssociationTest, FindsTheLeaseAndWarrantyOfAComputer) {
     EXPECT_EQ(valueIn(outcome.instances().front(), "Lessor"), "ACME");
 }
 
-TEST_F(AssociationTest, FindsTheComputerOfALeaseEvenIfItIsTheLast) {
+TEST_F(AssociationTest, FindsTheComputerOfARecordEvenIfThatComputerIsEnumeratedLast) {
     EXPECT_THAT(names(keyedPath(lease, firstNode)), ElementsAre(alpha));
     EXPECT_THAT(names(keyedPath(lease, secondNode)), ElementsAre(beta));
     EXPECT_THAT(names(keyedPath(warranty, firstNode)), ElementsAre(alpha));
@@ -92,7 +92,7 @@ TEST_F(AssociationTest, FindsTheComputerOfALeaseEvenIfItIsTheLast) {
     EXPECT_EQ(valueIn(outcome.instances().front(), "Model"), "Model of beta");
 }
 
-TEST_F(AssociationTest, FindsNothingForALeaseWithoutComputer) {
+TEST_F(AssociationTest, FindsNothingForUnassociatedOrMissingObjects) {
     for (const ObjectPath& path : {keyedPath(lease, "stray"), keyedPath(warranty, secondNode), keyedPath(lease, "none"),
                                    computerPath("gamma")}) {
         EXPECT_THAT(names(path), IsEmpty()) << testsupport::toText(path);
@@ -100,7 +100,7 @@ TEST_F(AssociationTest, FindsNothingForALeaseWithoutComputer) {
     }
 }
 
-TEST_F(AssociationTest, AllSixOperationsAgree) {
+TEST_F(AssociationTest, EnumerationsAndReferencesAgree) {
     const std::string one = std::string(alpha) + " -> " + firstLease;
     const std::string other = std::string(beta) + " -> " + secondLease;
     const Outcome instances = gate().enumerateInstances(classPath(leaseSetting));
@@ -125,7 +125,8 @@ TEST_F(AssociationTest, ReturnsAnAssociationInstanceByItsPath) {
     for (const ObjectPath& path : paths) {
         const Outcome outcome = gate().getInstance(path, {{"Dependent"}});
         EXPECT_THAT(outcome, isAnswered(1));
-        EXPECT_EQ(ends(outcome.instances()), ends(std::vector<ObjectPath>{path})) << "keys stay";
+        EXPECT_EQ(ends(outcome.instances()), ends(std::vector<ObjectPath>{path}))
+            << "keys are returned although not listed";
     }
 }
 
@@ -146,7 +147,7 @@ TEST_F(AssociationTest, DoesNotFindAMissingAssociation) {
     EXPECT_THAT(gate().getInstance(classPath(leaseSetting)), isRefused(CMPI_RC_ERR_INVALID_PARAMETER, "Antecedent"));
 }
 
-TEST_F(AssociationTest, AcceptsReferencesWithoutNamespace) {
+TEST_F(AssociationTest, AcceptsReferencesWithoutNamespaceAndInAnyLetterCase) {
     ObjectPath computer = computerPath("ALPHA");
     computer = testsupport::objectPath("", "velko_computersystem", {named("NAME", text("alpha"))});
     const ObjectPath element = testsupport::objectPath("", "velko_lease", {named("instanceid", text(firstNode))});
@@ -251,7 +252,7 @@ TEST_F(AssociationTest, ReportsAndLogsTheStatusOfAFailedEnumeration) {
     EXPECT_THAT(logged, ElementsAre("log: " + outcome.message, "trace: " + outcome.message));
 }
 
-TEST_F(AssociationTest, RefusesOtherClasses) {
+TEST_F(AssociationTest, FindsNothingForOtherClasses) {
     EXPECT_THAT(names(testsupport::objectPath(nameSpace, agent, {named("Name", text("x"))})), IsEmpty());
     EXPECT_THAT(names(testsupport::objectPath(nameSpace, "VELKO_Unknown", {named("Name", text("x"))})), IsEmpty());
 }

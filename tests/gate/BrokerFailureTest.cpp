@@ -16,7 +16,7 @@ using testing::HasSubstr;
 
 constexpr CMPIrc brokerCode = CMPI_RC_ERR_ACCESS_DENIED;
 
-/** Broker functions that the gate calls, directly or through the provider, except for its error messages. */
+/** Broker functions that the gate calls, directly or through the provider, except those for error messages. */
 const std::vector<std::string> brokerFunctions{
     "CMPIBrokerEncFT.newObjectPath",    "CMPIBrokerEncFT.newInstance",   "CMPIBrokerEncFT.newDateTimeFromChars",
     "CMPIBrokerFT.enumerateInstances",  "CMPIObjectPathFT.addKey",       "CMPIObjectPathFT.getNameSpace",
@@ -27,17 +27,17 @@ const std::vector<std::string> brokerFunctions{
     "CMPIResultFT.returnInstance",      "CMPIResultFT.returnObjectPath", "CMPIResultFT.returnDone",
 };
 
-/** Functions whose failure the provider ignores on objects of the broker, so that the gate does not notice it. */
+/** Functions whose failures the provider ignores, so that the gate cannot detect them. */
 const std::set<std::string> ignoredByProvider{"CMPIObjectPathFT.addKey",    "CMPIObjectPathFT.getKeyCount",
                                               "CMPIObjectPathFT.getKey",    "CMPIObjectPathFT.getKeyAt",
                                               "CMPIInstanceFT.setProperty", "CMPIBrokerEncFT.newDateTimeFromChars"};
 
-/** A failing function of the result may have accepted an object before. */
+/** Returns whether a function belongs to the result, which keeps the objects that it accepted before a failing call. */
 bool isOfResult(const std::string& function) {
     return function.find("CMPIResultFT.") == 0;
 }
 
-/** Two leases. The requests of these tests do not address the first one. */
+/** Two leases. The requests of these tests do not change the first one. */
 class BrokerFailureTest : public GateTest {
 protected:
     using RequestCall = std::function<Outcome()>;
@@ -65,7 +65,10 @@ protected:
         };
     }
 
-    /** Counts the calls of a function in a successful run of the request, and reverts the request's changes. */
+    /**
+     * Runs the request without failures, stores its results in `good`, and reverts its changes. Returns the number of
+     * calls to the function.
+     */
     int callsOf(const std::string& function, const RequestCall& request) {
         broker.forget();
         const Outcome outcome = request();
@@ -88,7 +91,7 @@ protected:
         return answers;
     }
 
-    /** Restores the initial values of the two leases. */
+    /** Deletes the new lease, and restores the second lease with its initial values. */
     void restore() {
         gate().deleteInstance(keyedPath(lease, "L3"));
         create(secondNode);
@@ -114,12 +117,12 @@ protected:
         EXPECT_THAT(state(), testing::Contains("other lease First")) << what;
     }
 
-    std::vector<std::string> good{};  ///< results of the request without failures
+    std::vector<std::string> good{};  ///< results of the request if no call fails
 };
 
 class EachOperationTest : public BrokerFailureTest, public testing::WithParamInterface<const char*> {};
 
-TEST_P(EachOperationTest, ReturnsNoPartialResultIfAnyCallFails) {
+TEST_P(EachOperationTest, ReturnsTheCompleteResultOrAnErrorIfACallFails) {
     const RequestCall request = requests().at(GetParam());
     const std::vector<std::string> before = state();
     for (const std::string& function : brokerFunctions) {
@@ -150,7 +153,7 @@ TEST_P(EachOperationTest, SurvivesFunctionsThatReturnNull) {
         broker.answerNothingEver(function);
         const Outcome outcome = request();
         broker.cancelFailures();
-        expectValidResponse(outcome, function + " answers nothing");
+        expectValidResponse(outcome, function + " returns null");
         restore();
     }
 }
@@ -188,7 +191,7 @@ TEST_F(BrokerFailureTest, ReturnsAFixedMessageIfTheBrokerCannotCreateStrings) {
     EXPECT_THAT(gate().execQuery(classPath(lease), "WQL", "select"), isRefused(CMPI_RC_ERR_NOT_SUPPORTED, "Enumerate"));
 }
 
-/** A broker with a function that throws in one of the next calls. */
+/** A broker whose newObjectPath throws when callsUntilThrow reaches zero. */
 struct ThrowingBroker {
     static inline int callsUntilThrow = 0;
     static inline bool throwsStandard = false;
@@ -237,7 +240,7 @@ TEST_F(BrokerFailureTest, CatchesAllExceptionsAndServesTheNextRequest) {
     unload();  // before the broker is destroyed
 }
 
-TEST_F(BrokerFailureTest, WorksWithBrokersThatSetNoStates) {
+TEST_F(BrokerFailureTest, WorksWithBrokersThatSetNoValueStates) {
     for (const auto manager : {testsupport::Manager::sfcb, testsupport::Manager::openPegasus}) {
         testsupport::RecordingBroker loose;
         loose.emulate(manager);

@@ -43,7 +43,7 @@ private:
 /** A timeout that no test reaches. */
 constexpr std::chrono::hours longEnough{1};
 
-/** Waits until that number of threads waits for the lock. */
+/** Waits until `length` threads wait for the lock. */
 inline void awaitQueue(const gate::RequestLock& lock, std::size_t length) {
     while (lock.waiting() < length) {
         std::this_thread::yield();

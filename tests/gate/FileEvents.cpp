@@ -56,7 +56,7 @@ bool isRecorded(const std::string& name) {
     return Recording::events != nullptr && !name.empty() && name != "owner";
 }
 
-/** Records that a file was opened. @param existed whether it was there before */
+/** Records that opening a file created or truncated it. @param existed whether the file existed before */
 void recordOpening(const char* path, bool existed, bool truncates) {
     const std::string name = nameOf(std::string(path));
     if (!isRecorded(name) || inodeOf(std::string(path)) == 0) {
@@ -69,7 +69,7 @@ void recordOpening(const char* path, bool existed, bool truncates) {
     }
 }
 
-/** Records data that were written before the present position of a file. */
+/** Records data that was just written, up to the current position of a file. */
 void recordWriting(int descriptor, std::string data) {
     if (Recording::events != nullptr && isRecorded(nameOf(descriptor))) {
         const auto offset = static_cast<std::size_t>(lseek(descriptor, 0, SEEK_CUR)) - data.size();
@@ -87,7 +87,7 @@ void recordSync(int descriptor) {
 }  // namespace
 }  // namespace gatetest
 
-// Replace the C library's functions, also for the libraries under test.
+// These functions replace those of the C library, also for the libraries under test.
 
 namespace {
 

@@ -6,7 +6,7 @@
 #include <string>
 #include <vector>
 
-// Records the operations on files of the data directory, also those of the libraries under test.
+// Records operations on files in the data directory, including those of the libraries under test.
 
 namespace gatetest {
 
@@ -15,14 +15,14 @@ enum class Kind { create, rename, remove, syncNames, truncate, write, sync };
 /** An operation on a file of the data directory. */
 struct Event {
     Kind kind;
-    ino_t file;            ///< unless removed or the names were synced
+    ino_t file;            ///< 0 if the file was removed; the directory for syncNames
     std::string name{};    ///< of a file that was created, renamed or removed
     std::string target{};  ///< new name of a renamed file
     std::string data{};
     std::size_t offset = 0;  ///< of a write; the size after a truncation
 };
 
-/** Returns the number that identifies a file; 0 if there is none. */
+/** Returns the inode number of a file; 0 if the file does not exist. */
 ino_t inodeOf(const std::string& path);
 
 /** Records operations during its lifetime. */

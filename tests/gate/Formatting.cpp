@@ -14,7 +14,7 @@ using cimhost::ProviderResponse;
 
 struct RecordFile {
     const char* name;
-    const char* empty;  // /< a record with initial values, without its identifier
+    const char* empty;  ///< a record with initial values, without its identifier
 };
 
 constexpr RecordFile recordFiles[] = {
@@ -56,7 +56,8 @@ bool isProvidersFailure(const cimhost::Response& response) {
 }
 
 /**
- * Formats the records of a file, regardless of its count: identifier and first string, with blanks for underscores.
+ * Formats the identifier and the first string of each record in a file, with spaces instead of underscores. Ignores the
+ * number of records that the file states.
  */
 std::string formattedRecords(const std::string& content, const RecordFile& file) {
     const std::string empty = file.empty;

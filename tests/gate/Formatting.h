@@ -13,9 +13,8 @@ namespace gatetest {
 std::string formatted(const ObjectPath& path);
 
 /**
- * Formats a client's response: the paths of the results, separated by blanks; "error 6" for an error of the provider,
- * "manager's error 6" if the object manager replaced the provider's success, "died" if its process would have
- * crashed.
+ * Formats a client's response: the paths of the results, separated by spaces; "error 6" for an error of the provider,
+ * "manager's error 6" if the object manager replaced the provider's success, "died" if its process would have crashed.
  */
 std::string formatted(const cimhost::Response& response);
 
@@ -26,8 +25,8 @@ public:
     DataFiles();
 
     /**
-     * Describes the changes since: empty if there are none; for each changed record file "; Lease.dat: A B(ACME)"
-     * with the identifiers and, if set, the first string of each record; only "; asset.dat" for asset data.
+     * Describes the changes since construction: empty if there are none; for each changed record file "; Lease.dat: A
+     * B(ACME)" with the identifiers and, if set, the first string of each record; only "; asset.dat" for asset data.
      */
     std::string changes() const;
 

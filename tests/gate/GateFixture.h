@@ -44,7 +44,8 @@ ObjectPath keyedPath(const std::string& className, const std::string& instanceId
 ObjectPath computerPath(const std::string& name);
 
 /**
- * Returns a property's value: the characters of a string or datetime, otherwise its MOF representation. None if null.
+ * Returns a property's value: the characters of a string or datetime, otherwise its MOF representation. Returns nullopt
+ * if the property is missing or null.
  */
 std::optional<std::string> valueIn(const Instance& instance, const std::string& property);
 
@@ -67,8 +68,9 @@ testing::Matcher<const Outcome&> isRefused(CMPIrc rc, const std::string& words);
 bool isLoaded(const std::string& file);
 
 /**
- * The gate's library over the provider and an agent with two computers, "alpha" and "beta", which the broker serves,
- * too. The library is loaded by the first call of gate(), so the provider loads files that were written before.
+ * The gate's library with the provider and an agent that has two computers, "alpha" and "beta". The broker serves the
+ * same two computers. The first call to gate() loads the library, so that the provider reads files written before that
+ * call.
  */
 class GateTest : public testing::Test {
 protected:
@@ -77,13 +79,13 @@ protected:
 
     testsupport::ProviderLibrary& gate();
 
-    /** Closes the library; the next gate() loads it again if it was unloaded. */
+    /** Closes the library. The next call to gate() loads the library again if it was unloaded. */
     void close();
 
     /** Closes the library. Fails the test if the gate or the provider stays loaded. */
     void unload();
 
-    /** @name Requests for a lease, or for the named class */
+    /** @name Requests for leases, or for the class `of` */
     ///@{
     Outcome create(const std::string& id, std::vector<NamedValue> properties = {}, const std::string& of = lease);
     Outcome modify(const std::string& id, std::vector<NamedValue> properties, const std::string& of = lease);
@@ -105,7 +107,7 @@ private:
     std::unique_ptr<testsupport::ProviderLibrary> library;
 };
 
-/** Permits lossy values in the agent's configuration during its lifetime. */
+/** The agent's configuration permits lossy values during the lifetime of this object. */
 class RefusalOff {
 public:
     RefusalOff() : before(testsupport::readFile(file())) {

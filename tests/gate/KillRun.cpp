@@ -2,8 +2,8 @@
 //
 // Usage: gate_kill_run KILLS [SEED]
 //
-// Exits with status 1 if an acknowledged change is lost, a refused or unanswered one is stored in part, or a record
-// appears twice or was created by no client.
+// Exits with status 1 if a response is wrong, an acknowledged change is lost, a refused change is stored, an unanswered
+// change is stored in part, or a record appears twice or was created by no client.
 
 #include <sys/wait.h>
 #include <unistd.h>
@@ -33,14 +33,16 @@ constexpr int clients = 8;
 constexpr int leasesPerClient = 5;
 constexpr int maximumDelay = 40000;  ///< microseconds after the first response
 
-/** A lease of a client. Its value is the number of the change that set it; 0 means that there is no such lease. */
+/**
+ * State of a client's lease. A value is the number of the change that wrote it; 0 means that the lease does not exist.
+ */
 struct LeaseState {
     int acknowledged;
-    int pending;  ///< the state that the current change leads to
+    int pending;  ///< the value after the current change
     bool isPending;
 };
 
-/** Knowledge of the clients, in memory that outlives them. */
+/** Knowledge of the clients, in memory that outlives their process. */
 struct Knowledge {
     std::array<std::array<LeaseState, leasesPerClient>, clients> leases;
     std::array<int, clients> answered;
@@ -55,7 +57,7 @@ std::string lessorOf(int value) {
     return "lessor of change " + std::to_string(value);
 }
 
-/** A client. Each changes its own leases only, so it knows the expected ones. */
+/** A client, which changes only its own leases and therefore knows their expected values. */
 class Client {
 public:
     Client(ManagedGate& itsGate, Knowledge& itsKnowledge, int itsNumber, unsigned int seed)
@@ -73,7 +75,7 @@ public:
 private:
     int upTo(int most) { return std::uniform_int_distribution<int>(0, most)(random); }
 
-    /** Makes a change, or in one of eight cases one that must be refused. */
+    /** Requests a change. On average, one of eight requests must be refused. */
     void change(const std::string& id, LeaseState& state) {
         const int value = 1 + upTo(1000000);
         const bool exists = state.acknowledged != 0;
@@ -131,7 +133,10 @@ int valueOf(const Instance& instance) {
     return value > 0 && valueIn(instance, "Lessor") == lessorOf(value) ? value : -1;
 }
 
-/** Compares the leases with the knowledge of the clients, then updates it. Returns the number of errors. */
+/**
+ * Compares the leases with the knowledge of the clients, then sets the knowledge to the leases found. Returns the
+ * number of errors.
+ */
 int check(Knowledge& knowledge) {
     ManagedGate gate(cimhost::lab::Manager::standard);
     const auto response = gate.manager().perform(cimhost::Request::enumerateInstances(classPath(lease)));
@@ -181,7 +186,10 @@ pid_t startProcess(Work work) {
     return child;
 }
 
-/** Runs clients and kills them some time after the first response. Returns false if nothing was answered. */
+/**
+ * Runs clients, and kills their process at a random time after the first response. Returns false if no request was
+ * answered, or if the process ended before.
+ */
 bool killClients(Knowledge& knowledge, std::mt19937& random) {
     knowledge.answered = {};
     const auto seed = static_cast<unsigned int>(random());

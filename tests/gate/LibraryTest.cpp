@@ -27,10 +27,10 @@ TEST_F(LibraryTest, ExportsExactlyTheTwoFactories) {
         "LeaseAndWarrantyGate_Create_AssociationMI T\nLeaseAndWarrantyGate_Create_InstanceMI T\n");
 }
 
-TEST_F(LibraryTest, LoadsTheProviderFromItsOwnDirectory) {
+TEST_F(LibraryTest, LoadsTheProviderAtTheFirstFactoryCall) {
     EXPECT_THAT(runCommand("readelf --dynamic " + gateFile()).output,
                 Not(HasSubstr("[libLeaseAndWarrantyProvider.so]")))
-        << "it would be loaded before its files are recovered";
+        << "a linked provider would be loaded before its files are recovered";
     EXPECT_FALSE(isLoaded(testsupport::underTest(PROVIDER_LIBRARY)));
     gate().instanceMI();
     EXPECT_TRUE(isLoaded(testsupport::underTest(PROVIDER_LIBRARY)));
@@ -61,7 +61,7 @@ TEST_F(LibraryTest, ReportsAMissingProvider) {
 TEST_F(LibraryTest, HasNoUndefinedSymbol) {
     const std::string relocations = runCommand("LD_PRELOAD= ldd -r " + gateFile()).output;
     EXPECT_THAT(relocations, HasSubstr("libkoframework.so"));
-    // In a build with sanitizers, the program defines their functions.
+    // In a build with sanitizers, the test program defines their functions.
     if (runCommand("nm --dynamic " + gateFile()).output.find("san_init") == std::string::npos) {
         EXPECT_THAT(relocations, Not(HasSubstr("undefined symbol")));
     }

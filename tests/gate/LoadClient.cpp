@@ -12,7 +12,7 @@ using testsupport::Form;
 using testsupport::ModelRecord;
 using testsupport::RecordModel;
 
-/** Returns a value of a field in the model's format. */
+/** Returns a value for a field, derived from the number, in the model's format. */
 std::string valueOf(Form form, int number) {
     switch (form) {
         case Form::number:
@@ -115,7 +115,7 @@ void LoadClient::expect(bool holds, const std::string& what, const cimhost::Stat
     }
 }
 
-/** Creates a record. All clients create shared records; one of them succeeds. */
+/** Creates a record. All clients try to create each shared record; one of them succeeds. */
 void LoadClient::create(const LoadedKind& kind, const std::string& id, int value, bool isShared) {
     const ModelRecord record = filledRecord(kind, id, value);
     const cimhost::Status status = gate.create(id, propertiesOf(kind, record), kind.className);
@@ -161,7 +161,10 @@ void LoadClient::enumerate(const LoadedKind& kind) {
     }
 }
 
-/** Finds the records of the computer. Each request makes an up-call, since another provider serves computers. */
+/**
+ * Follows the association of the first computer in both directions. Each request makes an up-call, since another
+ * provider serves computers.
+ */
 void LoadClient::associate(const LoadedKind& kind) {
     expectRecordsOf(kind, "alpha", {firstNode});
     expectComputer(kind, firstNode, "alpha");

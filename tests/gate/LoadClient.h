@@ -18,7 +18,10 @@ struct LoadedKind {
 /** Returns the classes of leases and warranties. */
 const std::vector<LoadedKind>& loadedKinds();
 
-/** Returns the asset properties that clients change. The client with the index of a property changes it. */
+/**
+ * Returns the asset properties that clients change. Each client changes the property whose index is the client's
+ * number.
+ */
 const std::vector<const char*>& loadedAssetProperties();
 
 /** Expected records and asset data, according to the responses to a client. */
@@ -37,9 +40,9 @@ std::vector<NamedValue> propertiesOf(const LoadedKind& kind, const testsupport::
 
 /**
  * One of the concurrent clients of a gate with two computers, the first of which has a lease and a warranty. It
- * creates, reads, changes, enumerates, associates and deletes. Client 0 also creates and deletes a lease and a
- * warranty of the second computer. Failures are collected in `problems`, since only the main thread may fail the
- * test.
+ * creates, reads, changes, enumerates and deletes records, and follows associations. Client 0 also creates and deletes
+ * a lease and a warranty of the second computer. Failures are collected in `problems`, since only the main thread may
+ * fail the test.
  */
 class LoadClient {
 public:

@@ -6,7 +6,7 @@
 #include "lab/emulation/ManagerEmulation.h"
 #include "support/Files.h"
 
-// Concurrent clients: after a mixed load, responses, tables and files agree.
+// Checks that responses, enumerations and files agree after a mixed load of concurrent clients.
 
 namespace gatetest {
 namespace {
@@ -101,7 +101,7 @@ protected:
         return expected;
     }
 
-    /** Merges the expectations of a client, which are disjoint from those of the others. */
+    /** Merges the expected state of a client. The expected states of the clients are disjoint. */
     static void merge(ExpectedState& all, const LoadClient& client) {
         EXPECT_THAT(client.problems, IsEmpty());
         for (const auto& [className, records] : client.expected.records) {
@@ -115,7 +115,7 @@ protected:
     SilentLog silence;
 };
 
-TEST_P(LoadTest, ClientsTablesAndFilesAgreeAfterAMixedLoad) {
+TEST_P(LoadTest, ResponsesEnumerationsAndFilesAgreeAfterAMixedLoad) {
     ExpectedState expected;
     {
         ManagedGate gate(GetParam());

@@ -13,7 +13,7 @@
 #include "EventLog.h"
 #include "gate/session/ProviderSession.h"
 
-// The request lock: closing, closed and reopened.
+// Tests the closing and reopening of the request lock.
 
 namespace gatetest {
 namespace {
@@ -35,7 +35,7 @@ TEST(LockClosingTest, AClosedLockAdmitsNoRequest) {
     lock.endRequest();
     EXPECT_TRUE(lock.close(longEnough));
     EXPECT_FALSE(lock.beginRequest());
-    EXPECT_FALSE(lock.close(longEnough)) << "it was already closed";
+    EXPECT_FALSE(lock.close(longEnough)) << "the lock was already closed";
 }
 
 TEST(LockClosingTest, ClosingWaitsForTheHolderAndTheQueue) {
@@ -69,7 +69,7 @@ TEST(LockClosingTest, ClosingWaitsForTheHolderAndTheQueue) {
                 ElementsAre("first inside", "go on", "first done", "second inside", "second done", "closed"));
 }
 
-TEST(LockClosingTest, AfterTheTimeoutClosingWaitsForTheHolderOnly) {
+TEST(LockClosingTest, AfterTheTimeoutClosingWaitsOnlyForTheHolder) {
     RequestLock lock;
     EventLog log;
     lock.beginRequest();
@@ -82,7 +82,7 @@ TEST(LockClosingTest, AfterTheTimeoutClosingWaitsForTheHolderOnly) {
     log.note("releasing");
     lock.release();
     closer.join();
-    EXPECT_THAT(log.all(), ElementsAre("releasing", "closed")) << "before the request ends";
+    EXPECT_THAT(log.all(), ElementsAre("releasing", "closed")) << "the lock is closed before the request ends";
     lock.endRequest();
 }
 
@@ -135,7 +135,7 @@ TEST(LockClosingTest, ReacquiringAClosedLockWaitsUntilItIsOpened) {
     lock.endRequest();
 }
 
-TEST(LockClosingTest, ReacquiringInAGenerationFailsOnceTheLockHasBeenClosed) {
+TEST(LockClosingTest, ReacquiringInAGenerationFailsAfterTheLockWasClosed) {
     RequestLock lock;
     ASSERT_TRUE(lock.beginRequest());
     ASSERT_TRUE(lock.acquire());
@@ -148,12 +148,12 @@ TEST(LockClosingTest, ReacquiringInAGenerationFailsOnceTheLockHasBeenClosed) {
     EXPECT_FALSE(lock.reacquire(generation));
     EXPECT_TRUE(lock.open());
     EXPECT_NE(lock.generation(), generation);
-    EXPECT_FALSE(lock.reacquire(generation)) << "its object manager has ended";
-    EXPECT_TRUE(lock.acquire()) << "the failed call does not acquire it";
+    EXPECT_FALSE(lock.reacquire(generation)) << "the object manager of this generation has ended";
+    EXPECT_TRUE(lock.acquire()) << "the failed call does not acquire the lock";
     lock.release();
 }
 
-TEST(LockClosingTest, ClosingRefusesOnlyWaitersOfItsGeneration) {
+TEST(LockClosingTest, ClosingRefusesOnlyWaitersThatRequireItsGeneration) {
     RequestLock lock;
     EventLog log;
     std::vector<std::thread> threads;
@@ -186,7 +186,7 @@ TEST(LockClosingTest, ClosingRefusesOnlyWaitersOfItsGeneration) {
     EXPECT_EQ(log.all().back(), "second again");
 }
 
-TEST(LockClosingTest, TheShutdownCallbackRunsWithTheLockHeldBeforeItIsClosed) {
+TEST(LockClosingTest, TheShutdownCallbackRunsWithTheLockHeldBeforeTheLockIsClosed) {
     RequestLock lock;
     EventLog log;
     std::thread released([&] {
@@ -204,7 +204,7 @@ TEST(LockClosingTest, TheShutdownCallbackRunsWithTheLockHeldBeforeItIsClosed) {
     EXPECT_TRUE(lock.close(std::chrono::seconds(0), RequestLock::Closing::temporary, [&] {
         log.note("ending");
         awaitQueue(lock, 1);
-        EXPECT_FALSE(lock.open()) << "it closes";
+        EXPECT_FALSE(lock.open()) << "the lock is closing";
         EXPECT_FALSE(lock.acquire());
         log.note("ended");
     }));
@@ -214,7 +214,7 @@ TEST(LockClosingTest, TheShutdownCallbackRunsWithTheLockHeldBeforeItIsClosed) {
     EXPECT_THAT(log.all(), ElementsAre("released", "ending", "ended", "opened", "again"));
 }
 
-TEST(LockClosingTest, AWaitingCloserDoesNotCloseALockThatWasOpenedMeanwhile) {
+TEST(LockClosingTest, AWaitingCloserDoesNotCloseALockThatWasReopenedMeanwhile) {
     RequestLock lock;
     ASSERT_TRUE(lock.beginRequest());
     std::atomic<int> ends{0};
@@ -239,7 +239,7 @@ TEST(LockClosingTest, RequestsOfOtherThreadsAreReported) {
     RequestLock lock;
     EXPECT_FALSE(lock.hasOtherRequests());
     lock.beginRequest();
-    EXPECT_FALSE(lock.hasOtherRequests()) << "on this thread";
+    EXPECT_FALSE(lock.hasOtherRequests()) << "the request is on this thread";
     std::thread([&] {
         EXPECT_TRUE(lock.hasOtherRequests());
         lock.beginRequest();
@@ -301,7 +301,7 @@ TEST(LockClosingTest, AForkedChildDoesNotWait) {
     log.await("inside");
     const pid_t child = fork();
     if (child == 0) {
-        alarm(60);  // a parent's request would block the child forever
+        alarm(60);  // waiting for a request of the parent process would block the child forever
         lock.close(longEnough);
         _exit(7);
     }

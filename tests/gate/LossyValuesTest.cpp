@@ -44,7 +44,7 @@ TEST_F(LossyValuesTest, AreRefusedAsIdentifiers) {
     }
     EXPECT_THAT(identifiers(), IsEmpty());
     for (const char* id : {"x", "*", "a b", "/system/computer"}) {
-        EXPECT_THAT(create(id), isAnswered(1)) << id << " comes back";
+        EXPECT_THAT(create(id), isAnswered(1)) << id << " survives the round trip";
     }
     unload();
     EXPECT_THAT(identifiers(), ElementsAre("x", "*", "a b", "/system/computer"));
@@ -80,7 +80,7 @@ TEST_F(LossyValuesTest, AStoredValueIsAcceptedAgain) {
     }
     testsupport::writeFile(dataFile("Lease.dat"),
                            "1\nL1\nA_\n00000000000000.000000-000\n0\n0\n0\n0\n0\n*\n*\n*\n*\n0\n");
-    EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "A ") << "the file adds a trailing blank";
+    EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "A ") << "the underscore in the file is read as a trailing blank";
     EXPECT_THAT(modify("L1", {named("Lessor", text("A ")), named("LeaseTerm", uint32(3))}), isDone());
     EXPECT_EQ(valueIn(instanceOf("L1"), "LeaseTerm"), "3");
 }
@@ -93,10 +93,11 @@ TEST_F(LossyValuesTest, AreAcceptedIfTheConfigurationPermitsThem) {
         EXPECT_EQ(valueIn(instanceOf(id), "Lessor"), value);
     }
     for (const char* id : {"two\nlines", "a\tb", "a\vb", "a\fb", "a\rb"}) {
-        EXPECT_THAT(create(id), isRefused(CMPI_RC_ERR_FAILED, "does not hold")) << id << " shifts the fields";
+        EXPECT_THAT(create(id), isRefused(CMPI_RC_ERR_FAILED, "does not hold"))
+            << id << " would shift the fields of the file";
     }
     EXPECT_THAT(create("L1", {named("Lessor", text("two\nlines"))}), isAnswered(1));
-    EXPECT_THAT(modify("L1", {named("LeaseTerm", uint32(3))}), isDone()) << "has too many lines";
+    EXPECT_THAT(modify("L1", {named("LeaseTerm", uint32(3))}), isDone()) << "the record has too many lines";
     EXPECT_THAT(remove("L1"), isDone());
     unload();  // before the configuration is restored
 }
@@ -126,7 +127,7 @@ TEST_F(LossyValuesTest, InvalidDatesBecomeNullIfTheConfigurationPermitsThem) {
 
 TEST_F(LossyValuesTest, AreRefusedWithAnAgentWithoutSettings) {
     const RefusalOff off;
-    // The gate uses the framework library that is loaded already.
+    // The gate uses the framework library that is already loaded.
     void* framework = dlopen(FRAMEWORK_WITHOUT_SETTINGS, RTLD_NOW | RTLD_LOCAL);
     ASSERT_NE(framework, nullptr) << dlerror();
     EXPECT_THAT(create("a_b"), isRefused(CMPI_RC_ERR_INVALID_PARAMETER, "underscore"));

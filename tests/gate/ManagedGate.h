@@ -10,7 +10,7 @@ namespace gatetest {
 enum class Served { byGate, byProvider };
 
 /**
- * An emulated object manager with the gate (or the provider without it) and the provider of computer systems. Its
+ * An emulated object manager with the gate (or with the provider alone) and the provider of computer systems. The
  * destructor closes the libraries.
  */
 class ManagedGate {
@@ -26,7 +26,7 @@ public:
     Instance instanceOf(const ObjectPath& path);
     ///@}
 
-    /** @name Requests that may fail: return the client's status with the provider's message */
+    /** @name Requests that can fail: return the client's status with the provider's message */
     ///@{
     cimhost::Status ask(const cimhost::Request& request);
     cimhost::Status create(const std::string& id, std::vector<NamedValue> properties, const std::string& of = lease);
@@ -38,7 +38,10 @@ private:
     std::unique_ptr<cimhost::ObjectManager> host;
 };
 
-/** Disables the agent's log during its lifetime, since thousands of requests would fill the disk. */
+/**
+ * Disables the agent's log during the lifetime of this object, since the logs of thousands of requests would fill the
+ * disk.
+ */
 class SilentLog {
 public:
     SilentLog();

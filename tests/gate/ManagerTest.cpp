@@ -2,7 +2,7 @@
 #include "lab/emulation/ManagerEmulation.h"
 #include "support/UnderTest.h"
 
-// Instances from creation to deletion, under each emulated object manager.
+// Creates, reads, changes and deletes instances under each emulated object manager.
 
 namespace gatetest {
 namespace {
@@ -20,7 +20,7 @@ protected:
     ManagerTest() { agentEnvironment::clear(); }
     ~ManagerTest() override { agentEnvironment::clear(); }
 
-    /** Expects a status; only a failure has a message. */
+    /** Expects the status code. Expects a message only for failures. */
     void expectStatus(const cimhost::Status& status, CMPIrc rc) {
         EXPECT_EQ(status.rc, rc) << status.message;
         EXPECT_EQ(status.message.empty(), rc == CMPI_RC_OK);
@@ -55,7 +55,7 @@ TEST_P(ManagerTest, StaysLoadedWhileIdle) {
     testsupport::writeFile(agentEnvironment::dataDirectory() / "Lease.dat", "");
     gate.manager().idle();
     EXPECT_TRUE(isLoaded(testsupport::underTest(GATE_LIBRARY)));
-    EXPECT_THAT(gate.identifiers(lease), ElementsAre("A1")) << "the file is not read again";
+    EXPECT_THAT(gate.identifiers(lease), ElementsAre("A1")) << "the library does not read the file again";
 }
 
 TEST_P(ManagerTest, ARecordWithoutIdentifierIsNotCreated) {
@@ -75,7 +75,7 @@ TEST_P(ManagerTest, TheAgentIsReadAndCannotBeChanged) {
 
 TEST_P(ManagerTest, AssetDataAreReadAndChanged) {
     const auto paths = gate.paths(asset);
-    ASSERT_THAT(paths, SizeIs(2)) << "one a computer";
+    ASSERT_THAT(paths, SizeIs(2)) << "one per computer";
     expectStatus(gate.modify(paths.front(), {named("PersonalizedData2", text("second"))}), CMPI_RC_OK);
     std::vector<NamedValue> sent = gate.instanceOf(paths.front()).properties;
     for (NamedValue& property : sent) {

@@ -10,11 +10,11 @@
 #include "GateFixture.h"
 #include "support/UnderTest.h"
 
-// Each allocation of the gate fails in turn.
+// Lets each allocation of the gate fail in turn.
 
 namespace {
 
-/** Number of the gate's allocation on this thread that fails, counted from now; 0 for none. */
+/** Number of the gate's allocation that fails on this thread, counted from the assignment; 0 for none. */
 thread_local long failingAllocation = 0;
 
 bool isIn(const void* address, const char* library) {
@@ -23,8 +23,8 @@ bool isIn(const void* address, const char* library) {
 }
 
 /**
- * Returns whether the gate allocates, also through the standard library. Allocations of the provider are not tested
- * here.
+ * Returns whether the caller is the gate, directly or through the standard library. Allocations of the provider do not
+ * fail in these tests.
  */
 bool isTheGate(void* caller) {
     void* frames[24];
@@ -51,7 +51,7 @@ void* allocateOrThrow(std::size_t size, void* caller) {
 
 }  // namespace
 
-// Replaces the standard library's operators, also for the libraries under test.
+// These operators replace those of the standard library, also for the libraries under test.
 void* operator new(std::size_t size) {
     return allocateOrThrow(size, __builtin_return_address(0));
 }

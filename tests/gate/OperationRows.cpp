@@ -18,19 +18,22 @@ BareResponse always(const std::string& answer) {
 }
 
 /**
- * A creation to which the provider responds with the instance. One manager returns its path, one misreads it, and one
- * fails because the instance has no usable path.
+ * A creation to which the provider responds with the instance instead of the path. One manager returns the instance's
+ * path, one misreads the instance, and two fail because the instance has no usable path.
  */
 BareResponse creation(const std::string& path, const std::string& stored, const std::string& storedWithoutKey) {
     return {path + stored, "root/cimv2[]" + stored, "manager's error 1", "manager's error 1" + storedWithoutKey};
 }
 
-/** A creation that succeeds without a result. A manager that passes an empty key stores a record with it. */
+/**
+ * A creation that succeeds without a result. With a manager that passes an empty key, the provider stores a record with
+ * an empty identifier.
+ */
 BareResponse silentCreation(const std::string& storedWithoutKey) {
     return {"manager's error 1", "died", "manager's error 1", "manager's error 1" + storedWithoutKey};
 }
 
-/** Unsupported requests for references: some managers return an empty success instead of the error. */
+/** Unsupported requests for references. Some managers return success without results instead of the error. */
 BareResponse unsupportedReferences() {
     return {"error 7", "error 7", "", ""};
 }
@@ -88,7 +91,7 @@ std::string allRecords(const RecordKind& kind) {
            formatted(recordPath(kind, secondNode));
 }
 
-/** Formats the change of a record file to these records. */
+/** Formats the expected change of a record file that contains these records afterwards. */
 std::string fileHas(const RecordKind& kind, const std::vector<std::string>& records) {
     std::string text = std::string("; ") + kind.file + ":";
     for (const std::string& each : records) {
@@ -155,7 +158,7 @@ Rows deletingRecords(const RecordKind& kind) {
     };
 }
 
-/** Returns the path of a product's instance with the agent's version. */
+/** Returns the path of a computer's asset data with the agent's version. */
 ObjectPath assetPath(const std::string& computer) {
     return testsupport::objectPath(nameSpace, asset,
                                    {named("IdentifyingNumber", text("/system")), named("Name", text(computer)),
@@ -274,7 +277,9 @@ Rows associations(const RecordKind& kind) {
     return rows;
 }
 
-/** Filters by role and class, from the first computer; the bare provider ignores them. */
+/**
+ * Association requests from the first computer with filters by role and class. The bare provider ignores the filters.
+ */
 Rows filters(const RecordKind& kind) {
     struct Filter {
         const char* name;
@@ -314,8 +319,8 @@ Rows filters(const RecordKind& kind) {
 }
 
 /**
- * Requests without an association class select all of them. A manager that passes them on returns the provider's
- * error.
+ * Requests without an association class select all association classes. The provider refuses such a request if the
+ * manager passes it on unchanged.
  */
 Rows anyAssociation() {
     const std::string records =

@@ -7,11 +7,11 @@
 #include "lab/emulation/ManagerEmulation.h"
 #include "model/Request.h"
 
-// Every operation of every class, with its expected responses.
+// Requests for every operation of every class, with their expected responses.
 
 namespace gatetest {
 
-/** The client's response to a request of the bare provider, per object manager. */
+/** The response of the bare provider that a client receives, per object manager. */
 struct BareResponse {
     std::string standard;
     std::string sfcb;
@@ -22,8 +22,8 @@ struct BareResponse {
 };
 
 /**
- * A request and its expected responses. The records firstNode, "L" and secondNode exist, as leases and as
- * warranties. Responses have the format of Formatting.h, with the changes of the data files.
+ * A request and its expected responses. The records firstNode, "L" and secondNode exist, as leases and as warranties.
+ * Responses have the format of Formatting.h, with the changes to the data files.
  */
 struct Row {
     std::string name;

@@ -29,11 +29,13 @@ protected:
         return response;
     }
 
-    std::string received;  ///< response of the client and changes of the files
+    std::string received;  ///< response to the client and changes to the files
     SilentLog silence;
 };
 
-/** Returns the rows for a manager: all, or its share, so that each row is tested with one manager. */
+/**
+ * Returns the rows for a manager: all rows, or a share of them such that each row is tested with at least one manager.
+ */
 std::vector<Row> rowsOf(Manager manager) {
     const std::vector<Row> all = operationRows();
     std::vector<Row> rows;
@@ -54,7 +56,7 @@ void expectStandardForm(const ProviderResponse& answer) {
     }
 }
 
-TEST_P(OperationTest, TheGateFollowsTheStandard) {
+TEST_P(OperationTest, TheGateReturnsTheExpectedResponsesUnderEveryManager) {
     for (const Row& row : rowsOf(GetParam())) {
         SCOPED_TRACE(row.name);
         const cimhost::Response response = ask(row, Served::byGate);
@@ -66,7 +68,7 @@ TEST_P(OperationTest, TheGateFollowsTheStandard) {
     }
 }
 
-TEST_P(OperationTest, TheBareProviderIsUnchanged) {
+TEST_P(OperationTest, TheBareProviderReturnsTheExpectedResponsesOfEachManager) {
     for (const Row& row : rowsOf(GetParam())) {
         SCOPED_TRACE(row.name);
         const cimhost::Response response = ask(row, Served::byProvider);
@@ -78,7 +80,7 @@ TEST_P(OperationTest, TheBareProviderIsUnchanged) {
     }
 }
 
-/** Creates two leases under a manager whose paths have empty keys. @return the identifiers after a restart */
+/** Creates two leases under a manager that passes empty keys in paths. @return the identifiers after a restart */
 std::vector<std::string> afterEmptyKeys(Served served) {
     agentEnvironment::clear();
     writeRecords({"A"});

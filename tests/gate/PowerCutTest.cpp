@@ -6,7 +6,8 @@
 #include "support/FullDisk.h"
 #include "support/TemporaryDirectory.h"
 
-// Power failures at each sync of a change. A failure between two syncs loses no more than one at the second.
+// Simulates power failures at each sync of a change. A failure between two syncs loses no more than a failure at the
+// second sync.
 
 extern const bool agentHasNoLog = true;
 
@@ -33,7 +34,7 @@ protected:
         file.recover();
         std::string content = file.content().value_or("(none)");
         content.resize(
-            std::min(content.find("saved copy "), content.size()));  // the last line of a copy does not matter
+            std::min(content.find("saved copy "), content.size()));  // the last line of a saved copy is irrelevant
         return results[files] = content;
     }
 
@@ -44,8 +45,9 @@ protected:
     }
 
     /**
-     * Writes files, and simulates power failures before each sync, when most operations may be lost, and at the end.
-     * @param disk the state before, in which the records can be recovered
+     * Runs work that writes files, and simulates power failures before each sync, when most operations can be lost, and
+     * at the end.
+     * @param disk the state of the disk before the work, from which the records can be recovered
      */
     void write(Disk disk, const std::string& before, const std::function<void()>& work) {
         std::vector<Event> events;
@@ -66,7 +68,8 @@ protected:
             disk.apply(event);
             ASSERT_FALSE(HasFailure());
         }
-        disk.eachState([&](const Files& files) { EXPECT_EQ(recovered(files), after) << "acknowledged"; });
+        disk.eachState(
+            [&](const Files& files) { EXPECT_EQ(recovered(files), after) << "the change was acknowledged"; });
     }
 
     const testsupport::TemporaryDirectory scratch{access("/dev/shm", W_OK) == 0 ? "/dev/shm" : "/tmp"};
@@ -85,7 +88,7 @@ TEST_F(PowerCutTest, LeavesTheStateBeforeOrAfterEachChange) {
     EXPECT_GT(results.size(), none + 100) << "states were tried";
 }
 
-TEST_F(PowerCutTest, LeavesTheStateBeforeOrAfterEachChangeOfAFewLinesWhateverSubsetIsWritten) {
+TEST_F(PowerCutTest, LeavesTheStateBeforeOrAfterEachChangeOfASmallFileWhicheverWritesAreLost) {
     recordFile = "Warranty.dat";
     const std::vector<NamedValue> values{named("Warrantor", text("ACME")), named("WarrantyDuration", uint32(36))};
     create("W1", {}, warranty);
@@ -116,7 +119,7 @@ TEST_F(PowerCutTest, LeavesARestorableFileDuringARecovery) {
     EXPECT_EQ(readFile(dataFile("Lease.dat")), complete);
 }
 
-TEST_F(PowerCutTest, LeavesTheReplacedOrTheNewRecordsDuringAnImport) {
+TEST_F(PowerCutTest, LeavesTheOldOrTheImportedRecordsDuringAnImport) {
     create("L1");
     const std::string imported = readFile(dataFile("Lease.dat"));
     create("L2");

@@ -2,7 +2,7 @@
 #include "support/Files.h"
 #include "support/FullDisk.h"
 
-// The message of a refused request must not contain data of other clients.
+// Checks that the message of a refused request does not contain data of other clients.
 
 namespace gatetest {
 namespace {
@@ -12,7 +12,7 @@ using testing::Not;
 using testsupport::FullDisk;
 using Outcomes = std::vector<Outcome>;
 
-/** Of two clients, the first has stored strings with its name in every writable place. */
+/** Two clients, the first of which has stored strings that contain its name in leases, a warranty and asset data. */
 class PrivacyTest : public GateTest {
 protected:
     static constexpr const char* first = "alice-with-a-name-of-some-length";
@@ -90,7 +90,7 @@ TEST_F(PrivacyTest, AFullDiskDoesNotRevealOtherRecords) {
         const FullDisk disk(leases.size() + 10);
         expectNothingOfFirst({create(second), create(second, {large}), modify(ofFirst, {large})});
     }
-    const FullDisk disk(leases.size() / 2);  // too small even for the old content
+    const FullDisk disk(leases.size() / 2);  // smaller than the old content
     expectNothingOfFirst({modify("shared", {large}), remove("shared")});
     const FullDisk none(1);
     expectNothingOfFirst({modifyAsset({named("AssetNumber", text(second))})});

@@ -1,7 +1,7 @@
 #include "ManagedGate.h"
 #include "lab/emulation/ManagerEmulation.h"
 
-// Property lists under every object manager: responses contain the listed properties and the keys.
+// Checks under every object manager that responses contain the listed properties and the keys.
 
 namespace gatetest {
 namespace {
@@ -20,7 +20,7 @@ struct Row {
     Names shown;
 };
 
-/** Includes duplicate names, names in another letter case and unknown names. */
+/** Returns rows whose lists include duplicate names, names in another letter case and unknown names. */
 std::vector<Row> rows(const ObjectPath& agentPath, const ObjectPath& assetPath) {
     const ObjectPath beta = computerPath("beta");
     const Names assetNames{"IdentifyingNumber", "Name", "Vendor", "Version", "AssetNumber"};
@@ -74,7 +74,7 @@ protected:
     ManagedGate gate{GetParam()};
 };
 
-TEST_P(PropertyListTest, ResponsesHaveTheListedPropertiesAndTheKeys) {
+TEST_P(PropertyListTest, ResponsesContainTheListedPropertiesAndTheKeys) {
     for (const Row& row : rows(gate.paths(agent).at(0), gate.paths(asset).at(0))) {
         SCOPED_TRACE(std::string(cimhost::nameOf(row.operation)) + " " + testsupport::toText(row.path));
         const std::vector<Instance> found = ask(row);

@@ -2,7 +2,7 @@
 
 #include "GateFixture.h"
 
-// The provider's requests behind a client's request, in order.
+// Checks which requests the gate sends to the provider for a client's request, and in which order.
 
 namespace gatetest {
 namespace {
@@ -12,7 +12,10 @@ using testing::IsEmpty;
 using testsupport::uint16;
 using Names = std::vector<std::string>;
 
-/** Leases of both computers and one more, the warranty of the first computer, and verified tables. */
+/**
+ * The leases of both computers, another lease, and the warranty of the first computer. The gate has already compared
+ * the records of both classes with their files, which takes further requests.
+ */
 class ProviderRequestsTest : public GateTest {
 protected:
     ProviderRequestsTest() {
@@ -22,14 +25,14 @@ protected:
         create(firstNode, {}, warranty);
     }
 
-    /** Returns the provider's entry points that a successful request of the gate calls. */
+    /** Returns the provider's entry points that the gate calls for a successful request. */
     static Names behind(const std::function<Outcome()>& request) {
         const Names names = behindAny(request);
         EXPECT_EQ(status, CMPI_RC_OK);
         return names;
     }
 
-    /** The same for a request that fails with a status. */
+    /** Returns the entry points that the gate calls for a request that fails with this status. */
     static Names behindFailure(int rc, const std::function<Outcome()>& request) {
         const Names names = behindAny(request);
         EXPECT_EQ(status, rc);
@@ -61,7 +64,7 @@ private:
     static inline int status = CMPI_RC_OK;
 };
 
-TEST_F(ProviderRequestsTest, AnEnumerationIsOne) {
+TEST_F(ProviderRequestsTest, AnEnumerationSendsOneRequest) {
     for (const char* name : {lease, warranty, asset, agent}) {
         const ObjectPath path = classPath(name);
         EXPECT_THAT(behind([&] { return gate().enumerateInstances(path); }), ElementsAre("EnumInstances"));
@@ -69,7 +72,7 @@ TEST_F(ProviderRequestsTest, AnEnumerationIsOne) {
     }
 }
 
-TEST_F(ProviderRequestsTest, AGetIsOneWhetherOrNotThereIsAnInstance) {
+TEST_F(ProviderRequestsTest, AGetSendsOneRequestWhetherOrNotTheInstanceExists) {
     for (const char* id : {firstNode, "L1"}) {
         EXPECT_THAT(behind([&] { return gate().getInstance(keyedPath(lease, id)); }), ElementsAre("GetInstance"));
     }
@@ -87,33 +90,33 @@ TEST_F(ProviderRequestsTest, AGetIsOneWhetherOrNotThereIsAnInstance) {
     }
 }
 
-TEST_F(ProviderRequestsTest, ACreationIsOneAndTwoMoreForValues) {
+TEST_F(ProviderRequestsTest, ACreationSendsOneRequestAndTwoMoreToSetValues) {
     EXPECT_THAT(behind([&] { return create("L2"); }), ElementsAre("CreateInstance"));
     EXPECT_THAT(behind([&] { return create("L3", {named("LeaseTerm", uint32(0))}); }), ElementsAre("CreateInstance"))
-        << "a new lease has this value";
+        << "a new lease already has this value";
     EXPECT_THAT(behind([&] {
                     return create("L4", {named("Lessor", text("ACME")), named("LeaseTerm", uint32(36))});
                 }),
                 ElementsAre("CreateInstance", "ModifyInstance", "GetInstance"));
 }
 
-TEST_F(ProviderRequestsTest, ACreationGetsARecordThatItNeedsForComparison) {
+TEST_F(ProviderRequestsTest, ACreationGetsTheRecordThatItIsComparedWith) {
     EXPECT_THAT(behindFailure(CMPI_RC_ERR_ALREADY_EXISTS, [&] { return create("L1"); }), ElementsAre("GetInstance"));
     EXPECT_THAT(behind([&] { return create("ACME"); }), ElementsAre("GetInstance", "CreateInstance"))
-        << "another value of the file is equal";
+        << "the file contains an equal value of another property";
     EXPECT_THAT(behind([&] { return create("L2", {named("ElementName", text("Lease Information"))}); }),
                 ElementsAre("EnumInstanceNames", "GetInstance", "CreateInstance"));
     remove(firstNode, warranty);
     EXPECT_THAT(behind([&] { return create("W2", {named("ElementName", text("Warranty Information"))}, warranty); }),
                 ElementsAre("EnumInstanceNames", "CreateInstance"))
-        << "there is no other record";
+        << "no other record exists";
     const NamedValue readOnly = named("ChangeableType", uint16(1));
     EXPECT_THAT(behindFailure(CMPI_RC_ERR_INVALID_PARAMETER, [&] { return create("L3", {readOnly}); }),
                 ElementsAre("EnumInstanceNames", "GetInstance"));
     EXPECT_THAT(behindFailure(CMPI_RC_ERR_INVALID_PARAMETER, [&] { return create("L_3"); }), IsEmpty());
 }
 
-TEST_F(ProviderRequestsTest, ACreationComparesReadOnlyValuesAlsoIfTheFileHasChangedTheFirstIdentifier) {
+TEST_F(ProviderRequestsTest, ACreationComparesReadOnlyValuesAlsoIfTheFileAltersTheFirstIdentifier) {
     remove(firstNode, warranty);
     unload();
     const RefusalOff off;
@@ -125,7 +128,7 @@ TEST_F(ProviderRequestsTest, ACreationComparesReadOnlyValuesAlsoIfTheFileHasChan
     unload();  // before the configuration is restored
 }
 
-TEST_F(ProviderRequestsTest, AModificationGetsTheInstanceBeforeAndAfter) {
+TEST_F(ProviderRequestsTest, AModificationGetsTheInstanceBeforeAndAfterTheChange) {
     const NamedValue other = named("Lessor", text("Other"));
     EXPECT_THAT(behind([&] { return modify("L1", {other}); }),
                 ElementsAre("GetInstance", "ModifyInstance", "GetInstance"));
@@ -138,12 +141,12 @@ TEST_F(ProviderRequestsTest, AModificationGetsTheInstanceBeforeAndAfter) {
                 ElementsAre("GetInstance", "ModifyInstance", "GetInstance"));
 }
 
-TEST_F(ProviderRequestsTest, ADeletionGetsTheRecordBefore) {
+TEST_F(ProviderRequestsTest, ADeletionGetsTheRecordFirst) {
     EXPECT_THAT(behind([&] { return remove("L1"); }), ElementsAre("GetInstance", "DeleteInstance"));
     EXPECT_THAT(behindFailure(CMPI_RC_ERR_NOT_FOUND, [&] { return remove("L1"); }), ElementsAre("GetInstance"));
 }
 
-TEST_F(ProviderRequestsTest, TheFirstRequestOfAClassListsItsNames) {
+TEST_F(ProviderRequestsTest, TheFirstRequestForAClassEnumeratesItsNames) {
     unload();
     EXPECT_THAT(behind([&] { return gate().getInstance(keyedPath(lease, "L1")); }),
                 ElementsAre("EnumInstanceNames", "GetInstance"));
@@ -153,7 +156,7 @@ TEST_F(ProviderRequestsTest, TheFirstRequestOfAClassListsItsNames) {
     EXPECT_THAT(behind([&] { return gate().enumerateInstances(classPath(warranty)); }), ElementsAre("EnumInstances"));
 }
 
-TEST_F(ProviderRequestsTest, TheFirstChangeOfAClassListsItsNames) {
+TEST_F(ProviderRequestsTest, TheFirstChangeInAClassEnumeratesItsNames) {
     unload();
     EXPECT_THAT(behind([&] { return create("L2"); }), ElementsAre("EnumInstanceNames", "CreateInstance"));
     EXPECT_THAT(behind([&] { return create("L3"); }), ElementsAre("CreateInstance"));
@@ -161,7 +164,7 @@ TEST_F(ProviderRequestsTest, TheFirstChangeOfAClassListsItsNames) {
                 ElementsAre("EnumInstanceNames", "GetInstance", "EnumInstanceNames", "DeleteInstance"));
 }
 
-TEST_F(ProviderRequestsTest, ATraversalFromAComputerIsOneForEachAssociation) {
+TEST_F(ProviderRequestsTest, ATraversalFromAComputerSendsOneRequestPerAssociationClass) {
     const ObjectPath source = computerPath("beta");
     EXPECT_THAT(behind([&] { return gate().associators(source, leases); }), ElementsAre("Associators"));
     EXPECT_THAT(behind([&] { return gate().associatorNames(source, leases); }), ElementsAre("AssociatorNames"));
@@ -173,7 +176,7 @@ TEST_F(ProviderRequestsTest, ATraversalFromAComputerIsOneForEachAssociation) {
                 ElementsAre("AssociatorNames", "AssociatorNames"));
 }
 
-TEST_F(ProviderRequestsTest, OtherTraversalsAndEnumerationsAreOneForEachComputer) {
+TEST_F(ProviderRequestsTest, OtherTraversalsAndEnumerationsSendOneRequestPerComputer) {
     const auto eachComputer = ElementsAre("AssociatorNames", "AssociatorNames");
     const ObjectPath source = keyedPath(lease, secondNode);
     EXPECT_THAT(behind([&] { return gate().associators(source, {}); }), eachComputer);
@@ -181,7 +184,7 @@ TEST_F(ProviderRequestsTest, OtherTraversalsAndEnumerationsAreOneForEachComputer
     EXPECT_THAT(behind([&] { return gate().enumerateInstances(classPath(leaseSetting)); }), eachComputer);
 }
 
-TEST_F(ProviderRequestsTest, AGetOfAnAssociationIsAtMostOne) {
+TEST_F(ProviderRequestsTest, AGetOfAnAssociationSendsAtMostOneRequest) {
     EXPECT_THAT(behind([&] { return gate().getInstance(settingPath("beta", secondNode)); }),
                 ElementsAre("AssociatorNames"));
     const auto isMissing = [&](const ObjectPath& path) {

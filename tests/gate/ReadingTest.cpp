@@ -1,7 +1,7 @@
 #include "GateFixture.h"
 #include "support/Files.h"
 
-// Reading all classes, and changing asset data.
+// Tests reads of leases, the agent and asset data, and changes to asset data.
 
 namespace gatetest {
 namespace {
@@ -16,7 +16,7 @@ using testsupport::namesOf;
 
 using ReadingTest = GateTest;
 
-TEST_F(ReadingTest, PropertyListsKeepTheKeys) {
+TEST_F(ReadingTest, KeysAreReturnedEvenIfThePropertyListOmitsThem) {
     create("L1", {named("Lessor", text("ACME")), named("LeaseTerm", uint32(12))});
     const cimhost::PropertyList list{{"lessor", "RenewalOption", "NoSuchProperty"}};
     const auto expected = UnorderedElementsAre("InstanceID", "Lessor", "RenewalOption");
@@ -33,7 +33,7 @@ TEST_F(ReadingTest, PropertyListsKeepTheKeys) {
     EXPECT_THAT(namesOf(keys.instances().front().properties), ElementsAre("InstanceID"));
 }
 
-TEST_F(ReadingTest, KeysAreReturnedEvenIfTheManagerFiltersThem) {
+TEST_F(ReadingTest, ThePropertyFilterContainsTheKeys) {
     create("L1");
     broker.forget();
     gate().getInstance(keyedPath(lease, "L1"), {{"Lessor"}});
@@ -42,7 +42,7 @@ TEST_F(ReadingTest, KeysAreReturnedEvenIfTheManagerFiltersThem) {
     EXPECT_THAT(filters.back().arguments, ElementsAre("{InstanceID,Lessor}", "{InstanceID}"));
 }
 
-TEST_F(ReadingTest, AListOfAllPropertiesEqualsNoList) {
+TEST_F(ReadingTest, AListOfAllPropertiesHasTheEffectOfNoList) {
     create("L1", {named("Lessor", text("ACME"))});
     const Instance whole = instanceOf("L1");
     std::vector<std::string> everything{"Caption", "Description", "ConfigurationName", "ChangeableType",
@@ -55,14 +55,14 @@ TEST_F(ReadingTest, AListOfAllPropertiesEqualsNoList) {
     EXPECT_EQ(namesOf(listed.instances().front().properties), namesOf(whole.properties));
 }
 
-TEST_F(ReadingTest, NullPropertiesOfTheListAreNull) {
+TEST_F(ReadingTest, ListedPropertiesWithoutAValueAreReturnedAsNull) {
     create("L1");
     const Outcome outcome = gate().getInstance(keyedPath(lease, "L1"), {{"BaseTermCommencementDate"}});
     ASSERT_THAT(outcome, isAnswered(1));
     EXPECT_TRUE(testsupport::isNull(outcome.instances().front().properties, "BaseTermCommencementDate"));
 }
 
-TEST_F(ReadingTest, TheAgentIsFoundByAllItsKeys) {
+TEST_F(ReadingTest, TheAgentIsFoundOnlyIfAllKeysMatch) {
     const Outcome names = gate().enumerateInstanceNames(classPath(agent));
     ASSERT_THAT(names, isAnswered(1));
     ObjectPath path = names.paths().front();
@@ -88,13 +88,14 @@ protected:
     }
 };
 
-TEST_F(AssetTest, AChangeOfOnePropertyChangesNoOther) {
+TEST_F(AssetTest, AChangeLeavesOtherPropertiesUnchanged) {
     EXPECT_THAT(change({named("PersonalizedLabel1", text("Room")), named("PersonalizedData1", text("12")),
                         named("PersonalizedLabel2", text("Floor")), named("PersonalizedData2", text("3")),
                         named("PrimaryOwnerName", text("Jo Example"))}),
                 isDone());
     const Instance before = current();
-    EXPECT_EQ(valueIn(before, "PersonalizedLabel3"), "Null") << "not the preceding label";
+    EXPECT_EQ(valueIn(before, "PersonalizedLabel3"), "Null")
+        << "a missing label does not take the value of the preceding label";
     EXPECT_THAT(change({named("PersonalizedData2", text("4")), named("PrimaryOwnerPhone", text("+49 1"))}), isDone());
     const Instance after = current();
     for (const std::string& name : namesOf(after.properties)) {
@@ -108,7 +109,7 @@ TEST_F(AssetTest, AChangeOfOnePropertyChangesNoOther) {
     }
 }
 
-TEST_F(AssetTest, AnUnchangedInstanceIsAccepted) {
+TEST_F(AssetTest, AReadInstanceWithOneChangedValueIsAccepted) {
     change({named("ZOPMProfile", text("Office")), named("AssetNumber", text("A_1 _ 2"))});
     Instance sent = current();
     for (NamedValue& property : sent.properties) {
@@ -122,7 +123,7 @@ TEST_F(AssetTest, AnUnchangedInstanceIsAccepted) {
     EXPECT_EQ(valueIn(current(), "DeploymentProfile"), "Factory");
 }
 
-TEST_F(AssetTest, APathWithoutKeysChangesNothing) {
+TEST_F(AssetTest, APathThatLacksKeysIsRefusedAndChangesNothing) {
     ObjectPath keyless = path();
     const Instance sent = testsupport::instance(keyless, {named("AssetNumber", text("A1"))});
     while (!keyless.keys.empty()) {
@@ -165,7 +166,7 @@ TEST_F(AssetTest, ZerosUnsetADate) {
     EXPECT_THAT(change({named("PurchaseDate", dateTime("00000000000000.000000-000"))}), isDone());
 }
 
-TEST_F(AssetTest, ReadOnlyPropertiesAreRefusedByName) {
+TEST_F(AssetTest, ReadOnlyPropertiesAreRefusedAndNamed) {
     const std::vector<NamedValue> readOnly{named("AssetIdTag", text("x")), named("DeploymentProfile", text("x")),
                                            named("Vendor", text("x")), named("AssetIDStringArea", uint32(1))};
     for (const NamedValue& property : readOnly) {

@@ -1,7 +1,7 @@
 #include "GateFixture.h"
 #include "support/Files.h"
 
-// Leases and warranties through the gate.
+// Creates, reads, changes and deletes leases and warranties through the gate.
 
 namespace gatetest {
 namespace {
@@ -17,7 +17,7 @@ using testsupport::nullOf;
 
 using RecordTest = GateTest;
 
-/** Returns null for every property of a lease, as managers send it for properties that a client omits. */
+/** Returns null for properties of a lease. Managers send null for properties that a client omits. */
 std::vector<NamedValue> allNull() {
     std::vector<NamedValue> properties;
     for (const char* name : {"Caption", "Description", "ElementName", "Lessor", "BaseRent", "FairMarketRental"}) {
@@ -61,7 +61,7 @@ TEST_F(RecordTest, ANewRecordNeedsAKey) {
     EXPECT_FALSE(std::filesystem::exists(dataFile("Lease.dat"))) << "nothing was written";
 }
 
-TEST_F(RecordTest, TheKeyOfThePathPrecedesThatOfTheInstance) {
+TEST_F(RecordTest, TheKeyInThePathTakesPrecedenceOverTheKeyInTheInstance) {
     const Outcome outcome = create("L1", {named("InstanceID", text("L2")), named("Lessor", text("ACME"))});
     EXPECT_THAT(outcome, isAnswered(1));
     EXPECT_THAT(identifiersOf(outcome.paths()), ElementsAre("L1"));
@@ -76,7 +76,7 @@ TEST_F(RecordTest, AnExistingRecordIsNotCreatedAgain) {
     EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "ACME");
 }
 
-TEST_F(RecordTest, ARecordWhoseIdentifierFollowsANumberIsNotCreatedAgain) {
+TEST_F(RecordTest, ARecordWhoseIdentifierIsOnTheLineOfTheCountIsNotCreatedAgain) {
     testsupport::writeFile(dataFile("Warranty.dat"), "1abc\nACME\n00000000000000.000000-000\n12\na later line\n");
     EXPECT_THAT(create("abc", {}, warranty), isRefused(CMPI_RC_ERR_ALREADY_EXISTS, "abc"));
     EXPECT_THAT(identifiers(warranty), ElementsAre("abc"));
@@ -104,7 +104,7 @@ TEST_F(RecordTest, ACreationWithAReadOnlyValueIsRefused) {
     EXPECT_THAT(create("L1", {named("ElementName", text("Lease Information"))}), isAnswered(1));
 }
 
-TEST_F(RecordTest, ARefusedCreationIsCheckedAgainstAnExistingRecordWithoutWriting) {
+TEST_F(RecordTest, ReadOnlyValuesOfANewRecordAreComparedWithAnExistingRecordWithoutWriting) {
     create("L1", {named("Lessor", text("ACME"))});
     const auto written = std::filesystem::last_write_time(dataFile("Lease.dat"));
     const std::string stored = testsupport::readFile(dataFile("Lease.dat"));
@@ -172,7 +172,7 @@ TEST_F(RecordTest, ANullKeyInAnyRepresentationIsRefused) {
     EXPECT_THAT(identifiers(), ElementsAre("L1"));
 }
 
-TEST_F(RecordTest, AModificationChangesOnlyThePropertiesOfTheInstance) {
+TEST_F(RecordTest, AModificationIgnoresNullAndMissingProperties) {
     create("L1", {named("Lessor", text("ACME")), named("LeaseTerm", uint32(36)), named("RenewalOption", boolean(true)),
                   named("BaseTermCommencementDate", dateTime("20260101000000.000000+060"))});
     std::vector<NamedValue> properties = allNull();
@@ -199,7 +199,7 @@ TEST_F(RecordTest, AModificationAppliesItsPropertyListInAnyLetterCase) {
     EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "ACME");
 }
 
-TEST_F(RecordTest, AnUnchangedInstanceIsAccepted) {
+TEST_F(RecordTest, AReadInstanceWithOneChangedValueIsAccepted) {
     create("L1",
            {named("Lessor", text("ACME")), named("BaseTermCommencementDate", dateTime("20260101000000.000000+060"))});
     Instance sent = instanceOf("L1");
@@ -210,7 +210,7 @@ TEST_F(RecordTest, AnUnchangedInstanceIsAccepted) {
     EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "Other");
 }
 
-TEST_F(RecordTest, AnOffsetOfZeroMayHaveEitherSign) {
+TEST_F(RecordTest, AnOffsetOfZeroIsAcceptedWithEitherSign) {
     create("L1", {named("BaseTermCommencementDate", dateTime("20260101000000.000000+000"))});
     const std::string stored = testsupport::readFile(dataFile("Lease.dat"));
     EXPECT_THAT(modify("L1", {named("BaseTermCommencementDate", dateTime("20260101000000.000000-000"))}), isDone());
@@ -232,7 +232,7 @@ TEST_F(RecordTest, ZerosUnsetADate) {
     }
 }
 
-TEST_F(RecordTest, AModificationWithTrimmedValuesChangesNothingElse) {
+TEST_F(RecordTest, AModificationKeepsStoredStringsThatAreSentTrimmed) {
     testsupport::writeFile(dataFile("Lease.dat"),
                            "1\nL1\n_Bail_Ren\xc3\xa9\n00000000000000.000000-000\n0\n0\n0\n0\n0\nACME_\n*\n*\n*\n0\n");
     const Instance before = instanceOf("L1");
@@ -258,7 +258,7 @@ TEST_F(RecordTest, APropertyListPermitsRemovingATrailingNonAsciiLetter) {
     EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "Bail Ren");
 }
 
-TEST_F(RecordTest, AChangedReadOnlyPropertyIsRefusedByNameAndNothingChanges) {
+TEST_F(RecordTest, AChangedReadOnlyPropertyIsRefusedAndNamedAndNothingChanges) {
     create("L1", {named("Lessor", text("ACME"))});
     const std::vector<NamedValue> readOnly{named("InstanceID", text("L2")), named("ElementName", text("mine")),
                                            named("ChangeableType", testsupport::uint16(1))};
@@ -270,7 +270,7 @@ TEST_F(RecordTest, AChangedReadOnlyPropertyIsRefusedByNameAndNothingChanges) {
     EXPECT_THAT(identifiers(), ElementsAre("L1"));
 }
 
-TEST_F(RecordTest, UnknownPropertiesAreRefusedByName) {
+TEST_F(RecordTest, UnknownPropertiesAreRefusedAndNamed) {
     create("L1", {named("Lessor", text("ACME"))});
     EXPECT_THAT(modify("L1", {named("Leasor", text("x"))}), isRefused(CMPI_RC_ERR_NO_SUCH_PROPERTY, "Leasor"));
     const ObjectPath path = keyedPath(lease, "L1");
@@ -279,7 +279,7 @@ TEST_F(RecordTest, UnknownPropertiesAreRefusedByName) {
     EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "ACME");
 }
 
-TEST_F(RecordTest, IntegersOfAnyTypeAreAcceptedIfTheyFit) {
+TEST_F(RecordTest, IntegersOfAnyTypeAreAcceptedIfTheyAreInRange) {
     create("L1");
     EXPECT_THAT(modify("L1", {named("LeaseTerm", testsupport::uint64(4294967295))}), isDone());
     EXPECT_EQ(valueIn(instanceOf("L1"), "LeaseTerm"), "4294967295");
@@ -289,7 +289,7 @@ TEST_F(RecordTest, IntegersOfAnyTypeAreAcceptedIfTheyFit) {
     EXPECT_EQ(valueIn(instanceOf("L1"), "LeaseTerm"), "4294967295");
 }
 
-TEST_F(RecordTest, ValuesOfAnotherTypeAreRefusedByName) {
+TEST_F(RecordTest, PropertiesOfAnotherTypeAreRefusedAndNamed) {
     create("L1", {named("RenewalOption", boolean(true)), named("Lessor", text("ACME"))});
     const std::vector<NamedValue> wrong{named("RenewalOption", text("true")),
                                         named("RenewalOption", uint32(1)),
@@ -304,11 +304,11 @@ TEST_F(RecordTest, ValuesOfAnotherTypeAreRefusedByName) {
     EXPECT_EQ(valueIn(instanceOf("L1"), "RenewalOption"), "TRUE");
     EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "ACME");
     EXPECT_THAT(modify("L1", {named("BaseTermCommencementDate", text("20260101000000.000000+060"))}), isDone())
-        << "the string of a datetime";
+        << "a string in datetime format";
     EXPECT_THAT(identifiers(), ElementsAre("L1"));
 }
 
-TEST_F(RecordTest, DeletedRecordsAreRemovedFromTableAndFile) {
+TEST_F(RecordTest, DeletedRecordsAreRemovedFromMemoryAndFile) {
     create("L1");
     create("L2");
     EXPECT_THAT(remove("L1"), isDone());
@@ -337,7 +337,7 @@ TEST_F(RecordTest, UnsupportedOperationsAreRefused) {
                 isRefused(CMPI_RC_ERR_NOT_SUPPORTED, "queries"));
 }
 
-TEST_F(RecordTest, OtherClassesAreInvalid) {
+TEST_F(RecordTest, OtherClassesAreRefusedAsInvalid) {
     for (const char* other : {"VELKO_ComputerSystem", "VELKO_Leas", "VELKO_LeaseX", ""}) {
         const ObjectPath path = classPath(other);
         const auto refused = isRefused(CMPI_RC_ERR_INVALID_CLASS, other);

@@ -21,7 +21,7 @@ using testing::HasSubstr;
 using testsupport::readFile;
 using testsupport::writeFile;
 
-/** The errors that the gate has logged, in one string. */
+/** Returns the errors that the gate has logged, in one string. */
 std::string loggedErrors() {
     std::string errors;
     for (const auto& record : agentEnvironment::log()) {
@@ -32,7 +32,7 @@ std::string loggedErrors() {
     return errors;
 }
 
-/** Makes a directory unwritable during its lifetime, also for root. */
+/** Makes a directory unwritable during the lifetime of this object, even if the process runs as root. */
 class UnwritableDirectory {
 public:
     explicit UnwritableDirectory(const fs::path& path) : directory(path), before(fs::status(path).permissions()) {
@@ -55,7 +55,10 @@ public:
 private:
     static constexpr uid_t unprivileged = 65534;
 
-    /** Lets this thread read all files, since root may own the libraries' directory, but write none of root's. */
+    /**
+     * Permits this thread to read all files, since perhaps only root can read the directory of the libraries. The
+     * thread still cannot write root's files.
+     */
     static void permitReading() {
         __user_cap_header_struct header{_LINUX_CAPABILITY_VERSION_3, 0};
         __user_cap_data_struct sets[_LINUX_CAPABILITY_U32S_3]{};
@@ -109,7 +112,7 @@ TEST_F(RecoveryTest, AnEditedFileIsRead) {
     EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "Other");
 }
 
-TEST_F(RecoveryTest, WithoutSavedCopyTheFileIsKeptAndItsCountsAreLogged) {
+TEST_F(RecoveryTest, WithoutASavedCopyTheDamagedFileIsKeptAndItsRecordCountsAreLogged) {
     create("L1");
     create("L2");
     unload();
@@ -124,7 +127,7 @@ TEST_F(RecoveryTest, WithoutSavedCopyTheFileIsKeptAndItsCountsAreLogged) {
     EXPECT_EQ(readFile(dataFile("Lease.dat.damaged")), cut);
 }
 
-TEST_F(RecoveryTest, AnUnwritableDirectoryRefusesChangesAndIsRead) {
+TEST_F(RecoveryTest, RecordsInAnUnwritableDirectoryCanBeReadButNotChanged) {
     create("L1", {named("Lessor", text("ACME"))});
     const std::string complete = readFile(dataFile("Lease.dat"));
     fs::permissions(dataFile("Lease.dat"), fs::perms(0666));
@@ -139,7 +142,7 @@ TEST_F(RecoveryTest, AnUnwritableDirectoryRefusesChangesAndIsRead) {
     EXPECT_THAT(create("L2"), isAnswered(1));
 }
 
-TEST_F(RecoveryTest, AProcessThatMustNotWriteNeitherRestoresNorReadsAnIncompleteFile) {
+TEST_F(RecoveryTest, AProcessWithoutWritePermissionNeitherRestoresNorReadsAnIncompleteFile) {
     create("L1");
     unload();
     const std::string complete = readFile(dataFile("Lease.dat"));
@@ -156,12 +159,12 @@ TEST_F(RecoveryTest, AProcessThatMustNotWriteNeitherRestoresNorReadsAnIncomplete
     }
     EXPECT_EQ(readFile(dataFile("Lease.dat")), "1\nL1\n");
     EXPECT_EQ(loggedErrors().find("restored"), std::string::npos) << loggedErrors();
-    EXPECT_THAT(identifiers(), ElementsAre("L1")) << "it may write now";
+    EXPECT_THAT(identifiers(), ElementsAre("L1")) << "the process has write permission again";
     EXPECT_THAT(loggedErrors(), HasSubstr("It was restored from the saved copy"));
     EXPECT_EQ(readFile(dataFile("Lease.dat")), complete);
 }
 
-/** Returns the names in the data directory. */
+/** Returns the names of the files in the data directory. */
 std::set<std::string> namesInDirectory() {
     std::set<std::string> names;
     for (const auto& entry : fs::directory_iterator(agentEnvironment::dataDirectory())) {
@@ -170,7 +173,7 @@ std::set<std::string> namesInDirectory() {
     return names;
 }
 
-TEST_F(RecoveryTest, AReaderReportsThatTheDirectoryVanished) {
+TEST_F(RecoveryTest, AReaderReportsThatTheDirectoryWasRemoved) {
     create("L1");
     unload();
     fs::permissions(dataFile("Lease.dat"), fs::perms(0644));
@@ -186,7 +189,7 @@ TEST_F(RecoveryTest, AReaderReportsThatTheDirectoryVanished) {
     EXPECT_THAT(identifiers(), ElementsAre("L1"));
 }
 
-TEST_F(RecoveryTest, AProcessThatMustNotWriteReadsWithoutLockAndCopies) {
+TEST_F(RecoveryTest, AProcessWithoutWritePermissionReadsWithoutALockFileOrNewCopies) {
     for (const bool hasOwnerFile : {true, false}) {
         create("L1");
         unload();
@@ -202,7 +205,7 @@ TEST_F(RecoveryTest, AProcessThatMustNotWriteReadsWithoutLockAndCopies) {
             EXPECT_THAT(create("L2"), isRefused(CMPI_RC_ERR_FAILED, "cannot be changed by this process"));
         }
         EXPECT_EQ(namesInDirectory(), before);
-        EXPECT_THAT(create("L2"), isAnswered(1)) << "it becomes the owner";
+        EXPECT_THAT(create("L2"), isAnswered(1)) << "this process becomes the owner";
         EXPECT_THAT(remove("L1"), isDone());
         EXPECT_THAT(remove("L2"), isDone());
     }

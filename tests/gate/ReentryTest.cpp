@@ -16,7 +16,7 @@ namespace {
 constexpr int clients = 8;
 constexpr int roundsOfAClient = 20 / SHARES;
 
-/** Aborts the program if it is not destroyed in time, since requests that wait for each other would never end. */
+/** Aborts the program unless this object is destroyed within 100 seconds, since requests in a deadlock never end. */
 class Deadline {
 public:
     Deadline() : watch([this] { await(); }) {}
@@ -46,7 +46,7 @@ private:
     std::thread watch;
 };
 
-/** The thread on which an object manager calls the provider of an up-call. */
+/** The thread on which an object manager calls the provider that serves an up-call. */
 enum class UpCallThread { same, another };
 
 /** A broker whose provider of computers reads and changes leases through the gate before it responds. */

@@ -9,7 +9,7 @@
 
 #include "EventLog.h"
 
-// The order in which requests acquire the lock.
+// Tests how requests acquire the lock: order, mutual exclusion, temporary release and thread cancellation.
 
 namespace gatetest {
 namespace {

@@ -77,7 +77,7 @@ TEST_P(RoundTripTest, AppliesPropertyListsToReadingAndChanging) {
 INSTANTIATE_TEST_SUITE_P(Gate, RoundTripTest, testing::ValuesIn(cimhost::lab::everyManager),
                          cimhost::lab::ManagerName());
 
-/** A result that blocks after the first instance, as for a client that reads slowly. */
+/** A result that blocks when it receives the first instance, as for a client that reads slowly. */
 class SlowReader {
 public:
     explicit SlowReader(const CMPIResult& itsReal) : real(itsReal), functions(*real.ft), result(real) {

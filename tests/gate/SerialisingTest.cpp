@@ -16,7 +16,7 @@
 #include "support/Files.h"
 #include "support/UnderTest.h"
 
-// Number of concurrent requests in the provider.
+// Checks how many requests run concurrently in the provider.
 
 namespace gatetest {
 namespace {
@@ -56,19 +56,20 @@ public:
         changed.wait(lock, [&] { return inside > 0; });
     }
 
-    /** Returns whether a request is in the provider, or no request has been. */
+    /** Returns whether a request is in the provider, or none has entered it yet. */
     bool isBusy() {
         const std::lock_guard<std::mutex> lock(mutex);
         return inside > 0 || most == 0;
     }
 
     /**
-     * Conditions under which newInstance continues: the number of requests in the provider, and of arrived threads.
+     * newInstance continues when `most` reaches awaitedInside and the number of arrived threads reaches
+     * awaitedArrivals.
      */
     int awaitedInside = 0;
     int awaitedArrivals = 0;
     int most = 0;
-    bool awaitsSleep = false;  ///< newInstance also waits until all other arrived threads sleep
+    bool awaitsSleep = false;  ///< the next newInstance also waits until all other arrived threads sleep
     std::function<void()> whenOthersSleep = [] {};
 
 private:
@@ -118,7 +119,10 @@ protected:
     }
     ~SerialisingTest() override { agentEnvironment::clear(); }
 
-    /** All clients enumerate the only warranty concurrently. */
+    /**
+     * Lets all clients enumerate the only warranty concurrently. Expects the maximum number of requests in the
+     * provider.
+     */
     void load(const std::string& file, const char* name, int insideAtOnce) {
         testsupport::RecordingBroker broker;
         InsideCounter counter(*broker.handle());
@@ -264,12 +268,14 @@ TEST_F(SerialisingTest, AFactoryCallDoesNotWaitForRequests) {
     request.join();
 }
 
-/** Exits while a request is in the provider; with 9 if static objects are destroyed before the request ends. */
+/**
+ * Exits while a request is in the provider. The status is 9 if static objects are destroyed before the request ends.
+ */
 struct ExitWhileInside {
     static inline InsideCounter* counter = nullptr;
 
     static void run() {
-        // Never destroyed, since the other thread uses them until the process ends.
+        // These objects are never destroyed, since the other thread uses them until the process ends.
         static auto& broker = *new testsupport::RecordingBroker;
         static auto& inside = *new InsideCounter(*broker.handle());
         counter = &inside;
@@ -283,7 +289,7 @@ struct ExitWhileInside {
         static auto* library =
             new testsupport::ProviderLibrary(testsupport::underTest(GATE_LIBRARY), "LeaseAndWarrantyGate", broker);
         library->createInstanceMI(inside.handle(), nullptr);
-        // Runs before it.
+        // Runs before the destruction of the gate's static objects.
         std::atexit([] { counter->arrive(); });
         std::thread([] { library->enumerateInstances(classPath(warranty)); }).detach();
         inside.awaitInside();

@@ -18,7 +18,7 @@ using testing::ElementsAre;
 using testing::IsEmpty;
 using testing::Not;
 
-/** A broker with a blocking function, so that a test can act while a request is in progress. */
+/** A broker whose newInstance and enumerateInstances block, so that a test can act while a request is in progress. */
 class WaitingBroker {
 public:
     explicit WaitingBroker(const CMPIBroker& real) : services(*real.bft), factories(*real.eft), broker(real) {
@@ -45,7 +45,7 @@ public:
         changed.notify_all();
     }
 
-    std::function<void()> inUpCall;  // /< runs in the up-call, on its thread, instead of waiting
+    std::function<void()> inUpCall;  ///< runs on the thread of the up-call, instead of blocking it
 
 private:
     void wait() {
@@ -84,7 +84,7 @@ private:
 
 class ShutdownTest : public GateTest {
 protected:
-    /** Waits until the gate refuses requests. An invalid request is then refused with another status. */
+    /** Waits until the gate refuses all requests. The status of an invalid request changes then. */
     void awaitRefusal() {
         while (gate().getInstance(classPath("VELKO_Unserved")).rc != CMPI_RC_ERR_FAILED) {  // needs no lock
             std::this_thread::yield();
@@ -120,10 +120,10 @@ protected:
         });
         waiting.awaitArrival();
         EXPECT_THAT(gate().cleanupInstanceMI(true), isDone());
-        std::optional<testsupport::RecordingBroker> next;  // records the calls of both
+        std::optional<testsupport::RecordingBroker> next;  // records the calls to both brokers
         if (isReopened) {
             EXPECT_NE(gate().createInstanceMI(next.emplace().handle(), nullptr), nullptr);
-            EXPECT_THAT(identifiers(), ElementsAre(firstNode)) << "requests of the next manager";
+            EXPECT_THAT(identifiers(), ElementsAre(firstNode)) << "the gate serves the next manager";
         }
         testsupport::RecordingBroker& latest = next ? *next : broker;
         latest.forget();
@@ -199,7 +199,10 @@ TEST_F(ShutdownTest, CompletesARequestThatIsInAnUpCall) {
     unload();
 }
 
-/** In separate processes, since the library stays loaded. Both wait until the drain timeout. */
+/**
+ * This test and the next one run in separate processes, since the library stays loaded. Both wait for the drain
+ * timeout.
+ */
 TEST_F(ShutdownTest, RefusesARequestWhoseUpCallOutlastsTheShutdown) {
     testing::FLAGS_gtest_death_test_style = "threadsafe";
     EXPECT_EXIT(outlastShutdown(false), testing::ExitedWithCode(0), "");
@@ -226,7 +229,7 @@ TEST_F(ShutdownTest, AFactoryCallDuringShutdownFailsWithAMessage) {
     unload();
 }
 
-TEST_F(ShutdownTest, UsesTheNewTablesOfABroker) {
+TEST_F(ShutdownTest, AFactoryCallAdoptsTheNewFunctionTablesOfABroker) {
     create("L1");
     CMPIBrokerEncFT fewer = *broker.handle()->eft;
     fewer.newInstance = nullptr;
@@ -240,11 +243,14 @@ TEST_F(ShutdownTest, UsesTheNewTablesOfABroker) {
     unload();  // before the other broker is destroyed
 }
 
-/** Exits from another thread during an up-call, while the request waits; with 8 if the gate does not block that. */
+/**
+ * Exits from another thread during an up-call, while the request waits. The status is 8 if the gate does not block the
+ * exit.
+ */
 struct ExitInUpCall {
     static void run() {
-        // Runs after the gate's static objects are destroyed. Skips the leak check, which does not support the other
-        // threads.
+        // Runs after the gate's static objects are destroyed. Skips the leak check, which does not support other
+        // running threads.
         std::atexit([] { std::_Exit(8); });
         static auto& broker = *new testsupport::RecordingBroker;
         static auto& waiting = *new WaitingBroker(*broker.handle());
@@ -256,7 +262,7 @@ struct ExitInUpCall {
     }
 };
 
-TEST_F(ShutdownTest, TheProcessCanExitFromAThreadOfAnUpCall) {
+TEST_F(ShutdownTest, TheProcessCanExitFromAnotherThreadDuringAnUpCall) {
     testing::FLAGS_gtest_death_test_style = "threadsafe";
     EXPECT_EXIT(ExitInUpCall::run(), testing::ExitedWithCode(8), "");
 }

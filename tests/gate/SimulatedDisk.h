@@ -12,20 +12,20 @@
 #include "support/AgentEnvironment.h"
 #include "support/Files.h"
 
-// The states that a file system may have after a power failure. It may have any subset of the changes that were not
-// synced: of the names, and of the writes to each file. A write may be partial, and a file may have its final size
-// without the writes that extended it. A truncation takes effect before the writes that follow it.
+// Computes the states that a file system can have after a power failure. The disk can have any subset of the changes
+// that were not synced: changes to names, and writes to each file. A write can be partial. A file can have its final
+// size without the writes that extended it. A truncation takes effect before the writes that follow it.
 
 namespace gatetest {
 
-/** A set of writes, with the number of bytes of each that are on the disk. */
+/** The number of bytes of each write that are on the disk. */
 using WrittenSizes = std::vector<std::size_t>;
 
 /** The writes to a file between two truncations. */
 struct Writes {
     std::vector<Event> events{};
 
-    /** Adds all contents to which they may lead from a content. */
+    /** Adds all contents that a file with the content `start` can have after the writes. */
     void addContents(const std::string& start, std::set<std::string>& contents) const {
         for (const WrittenSizes& sizes : possible()) {
             std::string content = start;
@@ -45,11 +45,11 @@ struct Writes {
     }
 
 private:
-    static constexpr std::size_t most = 10;  ///< the number of writes of which all subsets are tried
+    static constexpr std::size_t most = 10;  ///< the maximum number of writes of which all subsets are tried
 
     /**
-     * Returns all subsets of the writes; of more than `most` writes, only prefixes, all writes except one, and single
-     * writes. Also returns each of the latter with the one write half done.
+     * Returns all subsets of up to `most` writes. Of any number of writes, returns the prefixes, all writes except one,
+     * and single writes, and each of these with half of the last, missing or single write.
      */
     std::vector<WrittenSizes> possible() const {
         std::vector<WrittenSizes> all;
@@ -78,12 +78,12 @@ private:
     }
 };
 
-/** A file's data: the synced content, and the operations since. */
+/** A file's data: the synced content, and the operations since the sync. */
 struct Data {
     std::string synced{};
     std::vector<Event> pending{};
 
-    /** With all operations since. */
+    /** Returns the content after all pending operations. */
     std::string current() const {
         std::string content = synced;
         for (const Event& event : pending) {
@@ -93,7 +93,7 @@ struct Data {
         return content;
     }
 
-    /** All contents that the file may have after a power failure. */
+    /** Returns all contents that the file can have after a power failure. */
     std::set<std::string> possible() const {
         std::set<std::string> contents{synced};
         std::set<std::string> starts{synced};
@@ -130,7 +130,7 @@ using Files = std::map<std::string, std::string>;
 /** The data directory on a disk. */
 class Disk {
 public:
-    /** The files as they are, all synced. */
+    /** Starts with the current files, all of them synced. */
     Disk() {
         for (const auto& entry : std::filesystem::directory_iterator(agentEnvironment::dataDirectory())) {
             names[entry.path().filename()] = inodeOf(entry.path());
@@ -138,7 +138,7 @@ public:
         }
     }
 
-    /** Regards a file's content as not synced. */
+    /** Marks a file's content as not synced. */
     void forget(const std::string& name) {
         Data& file = data.at(names.at(name));
         file = {{}, {{Kind::write, names.at(name), {}, {}, file.synced}}};
@@ -163,9 +163,9 @@ public:
         }
     }
 
-    /** Calls `body` with all states that the directory may have after a power failure. */
+    /** Calls `body` with each state that the directory can have after a power failure. */
     void eachState(const std::function<void(const Files&)>& body) const {
-        ASSERT_LT(pendingNames.size(), 8U) << "too many to try all";
+        ASSERT_LT(pendingNames.size(), 8U) << "too many changes to names to try all subsets";
         for (unsigned int chosen = 0; chosen < 1U << pendingNames.size(); ++chosen) {
             const Names kept = namesWith(chosen);
             eachContent(kept, kept.begin(), {}, body);

@@ -15,7 +15,7 @@ Function* systemsOwn(const char* name) {
 
 }  // namespace
 
-// Replace the C library's functions, also for the libraries under test.
+// These functions replace those of the C library, also for the libraries under test.
 
 extern "C" __attribute__((visibility("default"))) int clock_gettime(clockid_t clock, timespec* time) noexcept {
     static auto* const real = systemsOwn<int(clockid_t, timespec*)>("clock_gettime");

@@ -4,10 +4,12 @@
 
 namespace gatetest {
 
-/** Lets sleeping threads continue at once during its lifetime, while the clock advances by the time of their sleep. */
+/**
+ * During the lifetime of this object, calls to sleep return at once and advance the monotonic clock by their duration.
+ */
 struct SimulatedTime {
     static inline std::atomic<int> count{0};
-    static inline std::atomic<long long> nanoseconds{0};  ///< that the clock is ahead; never decreases
+    static inline std::atomic<long long> nanoseconds{0};  ///< by which the clock is ahead; never decreases
 
     SimulatedTime() { ++count; }
     ~SimulatedTime() { --count; }

@@ -26,7 +26,7 @@ using testsupport::readFile;
 
 using StorageTest = GateTest;
 
-/** Makes file systems appear full during its lifetime. */
+/** Makes file systems appear full during the lifetime of this object. */
 struct FullFileSystem {
     static inline int count = 0;
 
@@ -37,8 +37,8 @@ struct FullFileSystem {
 };
 
 /**
- * Controls opening files for writing during its lifetime: for each '+' of the string, a call succeeds, for each '-' one
- * fails; the last character applies to all later calls.
+ * Controls whether files can be opened for writing during the lifetime of this object. For each '+' of the string, a
+ * call succeeds; for each '-', a call fails. The last character applies to all later calls.
  */
 struct OpenResults {
     static inline const char* results = "+";
@@ -55,7 +55,10 @@ struct OpenResults {
     }
 };
 
-/** During its lifetime, only the gate can read record files, as if the provider had no free file descriptors. */
+/**
+ * During the lifetime of this object, only the gate can read record files, as if the provider had no free file
+ * descriptor.
+ */
 struct UnreadableRecords {
     static inline int count = 0;
 
@@ -74,7 +77,7 @@ std::vector<Outcome> changes(testsupport::ProviderLibrary& gate) {
             gate.modifyInstance(keyedPath(lease, "L1"), with("L1")), gate.deleteInstance(keyedPath(lease, "L1"))};
 }
 
-TEST_F(StorageTest, AMissingDataDirectoryRefusesChanges) {
+TEST_F(StorageTest, ChangesAreRefusedWithoutADataDirectory) {
     create("L1", {named("LeaseTerm", uint32(1))});
     fs::remove_all(agentEnvironment::dataDirectory());
     for (const Outcome& outcome : changes(gate())) {
@@ -84,7 +87,7 @@ TEST_F(StorageTest, AMissingDataDirectoryRefusesChanges) {
     EXPECT_THAT(identifiers(), ElementsAre("L1"));
     EXPECT_EQ(valueIn(instanceOf("L1"), "LeaseTerm"), "1");
     fs::create_directory(agentEnvironment::dataDirectory());
-    EXPECT_THAT(modify("L1", {named("LeaseTerm", uint32(2))}), isDone()) << "once there is one again";
+    EXPECT_THAT(modify("L1", {named("LeaseTerm", uint32(2))}), isDone()) << "after the directory exists again";
     EXPECT_THAT(readFile(dataFile("Lease.dat")), HasSubstr("L1\n"));
 }
 
@@ -155,7 +158,7 @@ TEST_F(StorageTest, RecordsThatTheProviderCouldNotReadAreNotReportedAsMissing) {
             EXPECT_THAT(remove(firstNode, name), isUnread);
             EXPECT_THAT(create("L2", {}, name), isUnread);
         }
-        EXPECT_THAT(gate().enumerateInstances(classPath(agent)), isAnswered(1)) << "without a file";
+        EXPECT_THAT(gate().enumerateInstances(classPath(agent)), isAnswered(1)) << "this class has no record file";
         EXPECT_THAT(remove(firstNode), isRefused(CMPI_RC_ERR_FAILED, "repeat the request"));
     }
     EXPECT_EQ(valueIn(instanceOf(firstNode), "Lessor"), "ACME");
@@ -188,7 +191,7 @@ TEST_F(StorageTest, AFullDiskRollsBackANewRecordWithValues) {
     const FullDisk disk(2 * stored.size() + 10);
     const Outcome outcome = create("L2", {named("Lessor", text(std::string(100, 'A')))});
     EXPECT_THAT(outcome, isRefused(CMPI_RC_ERR_FAILED, "disk may be full"));
-    EXPECT_THAT(outcome.message, testing::Not(HasSubstr("damaged"))) << "it is complete again";
+    EXPECT_THAT(outcome.message, testing::Not(HasSubstr("damaged"))) << "the file is complete again";
     EXPECT_EQ(readFile(dataFile("Lease.dat")), stored);
     EXPECT_THAT(identifiers(), ElementsAre("L1"));
 }
@@ -251,7 +254,7 @@ TEST_F(StorageTest, RollingBackNeedsNoDiskSpace) {
     EXPECT_EQ(valueIn(instanceOf("L1"), "LeaseTerm"), "0");
 }
 
-TEST_F(StorageTest, AProviderThatCannotBeLoadedAgainAnswersNothing) {
+TEST_F(StorageTest, RequestsAreRefusedWhileTheProviderCannotBeReloaded) {
     create("L1", {named("Lessor", text("ACME"))});
     void* const other = dlopen(testsupport::underTest(PROVIDER_LIBRARY).c_str(), RTLD_NOW);
     ASSERT_NE(other, nullptr);
@@ -273,7 +276,7 @@ TEST_F(StorageTest, AFileThatWasNotWrittenIsReported) {
         const OpenResults none("-");
         const Outcome outcome = modify("L1", {named("Lessor", text(lessor))});
         EXPECT_THAT(outcome, isRefused(CMPI_RC_ERR_FAILED, "Lease.dat was not written"));
-        EXPECT_THAT(outcome.message, testing::Not(HasSubstr("damaged"))) << "it never changed";
+        EXPECT_THAT(outcome.message, testing::Not(HasSubstr("damaged"))) << "the file never changed";
         EXPECT_EQ(valueIn(instanceOf("L1"), "Lessor"), "ACME");
     }
     EXPECT_EQ(readFile(dataFile("Lease.dat")), stored);
@@ -282,7 +285,7 @@ TEST_F(StorageTest, AFileThatWasNotWrittenIsReported) {
 TEST_F(StorageTest, AFileThatWasNotWrittenIsReportedEvenIfLossyValuesArePermitted) {
     const RefusalOff permitted;
     create("L1", {named("Lessor", text("A_B"))});
-    EXPECT_THAT(modify("L1", {named("Lessor", text("A B"))}), isDone()) << "the same in the file";
+    EXPECT_THAT(modify("L1", {named("Lessor", text("A B"))}), isDone()) << "both values are equal in the file";
     const OpenResults none("-");
     EXPECT_THAT(modify("L1", {named("Lessor", text("Other"))}),
                 isRefused(CMPI_RC_ERR_FAILED, "Lease.dat was not written"));
@@ -321,7 +324,7 @@ TEST_F(StorageTest, AChangeToAValueThatTheFileAlreadyHasSucceeds) {
     EXPECT_EQ(readFile(dataFile("Lease.dat")), byHand);
 }
 
-TEST_F(StorageTest, AFullFileSystemRefusesChangesBeforeWriting) {
+TEST_F(StorageTest, ChangesThatNeedSpaceAreRefusedBeforeWritingToAFullFileSystem) {
     create("L1", {named("LeaseTerm", uint32(1))});
     const ObjectPath path = gate().enumerateInstanceNames(classPath(asset)).paths().front();
     const std::string stored = readFile(dataFile("Lease.dat"));
@@ -334,7 +337,7 @@ TEST_F(StorageTest, AFullFileSystemRefusesChangesBeforeWriting) {
                     isRefused(CMPI_RC_ERR_FAILED, "No space left"));
         EXPECT_EQ(readFile(dataFile("Lease.dat")), stored);
         EXPECT_EQ(fs::last_write_time(dataFile("Lease.dat")), written);
-        EXPECT_THAT(remove("L1"), isDone()) << "that makes room";
+        EXPECT_THAT(remove("L1"), isDone()) << "a deletion frees space";
     }
     EXPECT_THAT(create("L2"), isAnswered(1));
 }
@@ -368,7 +371,7 @@ TEST_F(StorageTest, TheNextChangeRepairsADamagedFile) {
 }  // namespace
 }  // namespace gatetest
 
-// Replace the C library's functions, also for the libraries under test.
+// These functions replace those of the C library, also for the libraries under test.
 
 namespace {
 

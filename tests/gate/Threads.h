@@ -9,7 +9,7 @@ namespace gatetest {
 
 constexpr int clientCount = 32;
 
-/** Runs a function on a number of threads that start together. */
+/** Runs a function on `count` threads, which start it together. */
 template <class Body>
 void onThreads(int count, Body body) {
     std::mutex mutex;

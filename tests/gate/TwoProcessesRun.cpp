@@ -1,9 +1,11 @@
 // Two processes that make changes through the gate in one data directory at the same time.
 //
 // Usage: gate_two_processes_run CHANGES
-//   CHANGES   of each process; it closes the gate after each 100, so that the other one may become the owner
+//   CHANGES   number of changes of each process, which closes the gate after every 100 changes, so that the other
+//             process can become the owner
 //
-// Exits with status 1 if an acknowledged change is lost, or a change is refused for another reason than the owner.
+// Exits with status 1 if an acknowledged change is lost, or if a change is refused for any reason except that the other
+// process is the owner.
 
 #include <sys/wait.h>
 #include <unistd.h>
@@ -26,9 +28,9 @@ namespace {
 constexpr int leases = 5;
 constexpr int changesPerOwner = 100;
 
-/** Responses to a process. */
+/** Responses that a process has received. */
 struct Result {
-    std::array<int, leases> acknowledged;  ///< the last change of each lease
+    std::array<int, leases> acknowledged;  ///< the last acknowledged change of each lease
     int refused;                           ///< because the other process was the owner
     int wrong;
 };
@@ -39,7 +41,7 @@ std::string identifierOf(int process, int number) {
     return "lease " + std::to_string(number) + " of process " + std::to_string(process);
 }
 
-/** Makes one change, until the other process is not the owner. */
+/** Requests one change, and repeats the request while the other process is the owner. */
 void change(ManagedGate& gate, int process, int number, Result& result) {
     const int leaseNumber = number % leases;
     const std::string id = identifierOf(process, leaseNumber);
@@ -69,7 +71,7 @@ void work(int process, int changes, Result& result) {
     }
 }
 
-/** Compares the leases with the responses to the processes. Returns the number of differences. */
+/** Compares the leases with the responses that the processes have received. Returns the number of differences. */
 int check(const Results& results) {
     ManagedGate gate(cimhost::lab::Manager::standard);
     int wrong = gate.paths(lease).size() == 2 * leases ? 0 : 1;

@@ -20,7 +20,7 @@ namespace {
 using testing::ElementsAre;
 using testing::HasSubstr;
 
-/** Another process, which runs its tasks on request. */
+/** Another process, which runs a task on request. */
 class OtherProcess {
 public:
     explicit OtherProcess(std::vector<std::function<bool()>> tasks) {
@@ -71,7 +71,7 @@ private:
 
 using TwoProcessesTest = GateTest;
 
-TEST_F(TwoProcessesTest, OneReadsWhatTheOtherStores) {
+TEST_F(TwoProcessesTest, AReaderReadsTheRecordsThatTheOwnerStores) {
     OtherProcess owner({[&] { return create("L1", {named("LeaseTerm", uint32(1))}).rc == CMPI_RC_OK; },
                         [&] { return modify("L1", {named("LeaseTerm", uint32(2))}).rc == CMPI_RC_OK; }});
     ASSERT_TRUE(owner.does(0));
@@ -93,10 +93,10 @@ TEST_F(TwoProcessesTest, AReaderIsRefusedUntilTheOwnerHasWrittenTheFile) {
     testsupport::writeFile(dataFile("Lease.dat"), complete);
     EXPECT_THAT(identifiers(), ElementsAre("L1"));
     testsupport::writeFile(dataFile("Lease.dat"), complete.substr(0, complete.size() / 2));
-    EXPECT_THAT(identifiers(), ElementsAre("L1")) << "as read before";
+    EXPECT_THAT(identifiers(), ElementsAre("L1")) << "the records that were read before";
 }
 
-TEST_F(TwoProcessesTest, AReaderReturnsWhatItHasReadWhileTheOwnerWritesWithoutPause) {
+TEST_F(TwoProcessesTest, AReaderReturnsTheRecordsReadBeforeWhileTheOwnerWritesContinuously) {
     OtherProcess owner({[&] { return create("L1").rc == CMPI_RC_OK; }, [&] { return create("L2").rc == CMPI_RC_OK; }});
     ASSERT_TRUE(owner.does(0));
     EXPECT_THAT(identifiers(), ElementsAre("L1"));
@@ -120,7 +120,7 @@ TEST_F(TwoProcessesTest, AReaderReturnsWhatItHasReadWhileTheOwnerWritesWithoutPa
     EXPECT_THAT(identifiers(), ElementsAre("L1", "L2"));
 }
 
-TEST_F(TwoProcessesTest, AReaderRestoresWhatAnOwnerHasStoredThatEndedDuringAnotherChange) {
+TEST_F(TwoProcessesTest, AReaderRestoresTheRecordsOfAnOwnerThatEndedDuringAChange) {
     OtherProcess owner({[&] { return create("L1").rc == CMPI_RC_OK; }, [&] { return create("L2").rc == CMPI_RC_OK; }});
     ASSERT_TRUE(owner.does(0));
     EXPECT_THAT(identifiers(), ElementsAre("L1"));
@@ -132,7 +132,7 @@ TEST_F(TwoProcessesTest, AReaderRestoresWhatAnOwnerHasStoredThatEndedDuringAnoth
     EXPECT_EQ(testsupport::readFile(dataFile("Lease.dat")), complete);
 }
 
-TEST_F(TwoProcessesTest, AForkedChildOfTheOwnerReadsWhatTheOwnerStores) {
+TEST_F(TwoProcessesTest, AForkedChildOfTheOwnerReadsTheRecordsThatTheOwnerStores) {
     create("L1");
     OtherProcess child({[&] {
                             return identifiers() == std::vector<std::string>{"L1", "L2"};
@@ -147,7 +147,7 @@ TEST_F(TwoProcessesTest, AForkedChildOfTheOwnerReadsWhatTheOwnerStores) {
     EXPECT_THAT(identifiers(), ElementsAre("L1", "L2"));
 }
 
-TEST_F(TwoProcessesTest, AChangeIsRefusedWithTheNameOfTheOwnerUntilItEnds) {
+TEST_F(TwoProcessesTest, AChangeIsRefusedWithTheNameOfTheOwnerUntilTheOwnerEnds) {
     OtherProcess owner({[&] { return create("L1").rc == CMPI_RC_OK; }, [&] { return create("L2").rc == CMPI_RC_OK; }});
     ASSERT_TRUE(owner.does(0));
     const Outcome refused = [&] {
@@ -200,7 +200,7 @@ TEST_F(TwoProcessesTest, AnOwnerThatRegainsALostLockReadsTheSavedCopies) {
     EXPECT_THAT(identifiers(), ElementsAre("L1", "L2", "L3"));
 }
 
-TEST_F(TwoProcessesTest, TheFileOfAnEarlierOwnerLocksNothing) {
+TEST_F(TwoProcessesTest, TheLockFileOfAnEarlierOwnerLocksNothing) {
     create("L1");
     unload();
     EXPECT_THAT(testsupport::readFile(dataFile("owner")), HasSubstr("gate_test"));
@@ -210,11 +210,11 @@ TEST_F(TwoProcessesTest, TheFileOfAnEarlierOwnerLocksNothing) {
 
 TEST_F(TwoProcessesTest, AForkedChildDoesNotKeepTheLock) {
     create("L1");
-    OtherProcess child({[&] { return true; }});  // has inherited all files of this process
+    OtherProcess child({[&] { return true; }});  // has inherited all open files of this process
     unload();
     OtherProcess other({[&] { return create("L2").rc == CMPI_RC_OK; }});
     EXPECT_TRUE(other.does(0));
-    EXPECT_TRUE(child.does(0)) << "it is still there";
+    EXPECT_TRUE(child.does(0)) << "the child is still running";
 }
 
 }  // namespace

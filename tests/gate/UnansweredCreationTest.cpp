@@ -14,7 +14,7 @@ CMPIStatus refuse(const CMPIResult*, const CMPIObjectPath*) {
 
 class UnansweredCreationTest : public GateTest {
 protected:
-    /** Creates a lease "L1" with a result that refuses its path. */
+    /** Creates a lease "L1". The result refuses the path of the lease. */
     Outcome createUnanswered() {
         const ObjectPath path = keyedPath(lease, "L1");
         const Instance sent = testsupport::instance(path, {named("Lessor", text("ACME"))});

@@ -19,7 +19,10 @@ struct Manager : CMPIBroker {
     int calls = 0;
 };
 
-/** Counts calls with the manager's own pointer, and checks the lock. Returns zero. */
+/**
+ * Counts the calls that the manager's broker receives. Checks that the lock is released for a service and held for a
+ * constructor. Returns zero.
+ */
 template <auto slot, bool isService>
 struct Counting;
 
@@ -50,7 +53,7 @@ void expectForwarded(Table& managers, Manager& manager, Table* CMPIBroker::*tabl
     manager.calls = 0;
 }
 
-/** Expects that each slot is null if the manager's is. */
+/** Expects that slots of the wrapper are null if the manager's slots are null. */
 template <auto... slots, class Table>
 void expectMissing(Table* CMPIBroker::*table, Table& empty) {
     Manager manager{};
@@ -122,7 +125,7 @@ TEST(WrappedBrokerTest, VersionsNameAndThreadTableAreTheManagers) {
     EXPECT_EQ(wrapped.handle()->xft, &threads);
 }
 
-TEST(WrappedBrokerTest, RecordsAnswersThatCannotBeCreated) {
+TEST(WrappedBrokerTest, RecordsThatTheManagerCouldNotCreateAPath) {
     Manager manager{};
     CMPIBrokerEncFT makers{};
     makers.newObjectPath = &Counting<&CMPIBrokerEncFT::newObjectPath, false>::call;

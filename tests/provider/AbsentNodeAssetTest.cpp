@@ -1,4 +1,5 @@
-// Agents without a computer node or without a system node: the asset data are not read.
+// Tests the asset element with an agent without a computer node or without a system node. The element then does not
+// read its file.
 
 #include <gmock/gmock.h>
 

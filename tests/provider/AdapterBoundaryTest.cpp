@@ -1,5 +1,5 @@
-// Adapters over a framework that fails, or that writes a value and returns false. The program replaces operations of
-// the framework.
+// Tests adapters with a framework that fails, or that writes a value and returns false. The test program replaces
+// functions of the framework.
 
 #include <gmock/gmock.h>
 
@@ -13,7 +13,7 @@
 
 namespace {
 
-/** Called before the framework returns the computer's path; counts the calls. */
+/** Replaces the framework's request for the computer's path: counts the calls, and calls `before` first. */
 struct ComputerDouble {
     std::function<void()> before = [] {};
     int calls = 0;

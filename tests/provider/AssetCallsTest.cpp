@@ -59,7 +59,7 @@ protected:
         CleanAgent::TearDown();
     }
 
-    /** Returns the calls of an operation. */
+    /** Returns the framework calls of an operation. */
     template <class Operation>
     static Calls callsOf(Operation operation) {
         const std::size_t before = assetFileDouble::calls().size();
@@ -128,7 +128,7 @@ TEST_F(AssetCalls, OfAccessorsAccessNoFile) {
                 }).empty());
 }
 
-/** Exceptions of each type. */
+/** Functions that throw exceptions of different types. */
 const std::function<void()> failures[] = {[] { throw KO::FrameworkException("no"); },
                                           [] { throw std::runtime_error("no"); }, [] { throw 5; }};
 
@@ -157,7 +157,7 @@ TEST_F(AssetCalls, StopAfterAFailedRead) {
               (Calls{"read text USER.Phone locked", "unlock locked", "~PropertyFile"}));
 }
 
-/** Makes the Nth acquisition of the lock fail. */
+/** Makes one acquisition of the lock fail. @param number number of the acquisition, from 1 */
 void failLock(int number, const std::function<void()>& failure) {
     assetFileDouble::before(lock, [number, failure, taken = 0]() mutable {
         if (++taken == number) {
@@ -243,7 +243,7 @@ TEST_F(AssetCalls, ReadLabelAndDataOfAPairBeforeEitherIsLogged) {
     EXPECT_THAT(loggedBefore, ElementsAre(0, 2, 4, 6, 8));
 }
 
-TEST_F(AssetCalls, KeepValuesReadBeforeAFailure) {
+TEST_F(AssetCalls, WriteTheValuesReadBeforeAFailure) {
     assetFileDouble::values() = {{"USER.AssetNumber", "A-1"}, {"USER.Name", "Anna"}, {"USER.Position", "P"}};
     assetFileDouble::before("read text USER.Phone", failures[0]);
     AssetIDDetails element;

@@ -1,4 +1,4 @@
-// The asset element as a cursor over the computers, and the properties of each.
+// Tests the asset element as a cursor over the computers, and the properties of each computer.
 
 #include <gmock/gmock.h>
 
@@ -53,7 +53,7 @@ TEST_F(AssetCursor, VisitsEveryComputerWithoutAFilter) {
     EXPECT_TRUE(element.evaluate());
 }
 
-TEST_F(AssetCursor, SelectsComputersByNameAndThoseWithoutAName) {
+TEST_F(AssetCursor, SelectsComputersWithTheNameAndComputersWithoutAName) {
     AssetIDDetails element;
     filter(element, AssetIDDetails::FILTER_NAME, "tight");
     EXPECT_THAT(visited(element), ElementsAre("tight", "(none)"));
@@ -86,7 +86,7 @@ TEST_F(AssetCursor, FiltersByTheVersionOfTheProduct) {
     EXPECT_FALSE(hasCurrent(other));
 }
 
-TEST_F(AssetCursor, FiltersByIdentifyingNumberForTypeZeroAndUnnamedTypes) {
+TEST_F(AssetCursor, FiltersByIdentifyingNumberForAllOtherTypes) {
     for (const int type : {0, 4, 7, -1}) {
         AssetIDDetails matching;
         filter(matching, type, "/system%20one");
@@ -97,7 +97,7 @@ TEST_F(AssetCursor, FiltersByIdentifyingNumberForTypeZeroAndUnnamedTypes) {
     }
 }
 
-TEST_F(AssetCursor, RequiresEveryFilterToPass) {
+TEST_F(AssetCursor, RequiresAllFiltersToMatch) {
     AssetIDDetails element;
     filter(element, AssetIDDetails::FILTER_VENDOR, "Example Maker");
     filter(element, AssetIDDetails::FILTER_NAME, "dashless");
@@ -108,7 +108,7 @@ TEST_F(AssetCursor, RequiresEveryFilterToPass) {
     EXPECT_FALSE(element.evaluate());
 }
 
-TEST_F(AssetCursor, FiltersFromTheCurrentComputer) {
+TEST_F(AssetCursor, FiltersFromTheCurrentComputerOnward) {
     AssetIDDetails element;
     ++element;
     ++element;
@@ -192,7 +192,7 @@ std::time_t secondsOf(const std::string& text) {
     return timegm(&fields) - (sign == '-' ? -offset : offset) * 60;
 }
 
-/** Sets the variable TZ while it exists. */
+/** Sets the environment variable TZ during the lifetime of this object. */
 class TimeZone {
 public:
     explicit TimeZone(const char* zone) {

@@ -6,8 +6,8 @@
 #include <vector>
 
 /**
- * Test double of the framework's locks, files and property files. Records the calls of the asset element and whether
- * the lock was held, and injects failures.
+ * Test double of the framework's locks, files and property files. Records the calls that the asset element makes and
+ * whether the lock was held, and injects failures.
  */
 namespace assetFileDouble {
 
@@ -17,7 +17,7 @@ const std::vector<std::string>& calls();
 /** Returns whether the lock is held. */
 bool locked();
 
-/** Values by key. A key that is not in the map has an empty value. */
+/** Returns the values of the property file by key. A key that is not in the map has an empty value. */
 std::map<std::string, std::string>& values();
 
 /** Runs an action before each call with this string, including its arguments. If the action throws, the call fails. */

@@ -155,7 +155,7 @@ void expectUnlocked() {
     KO::_fileMutex.unlock();
 }
 
-TEST_F(AssetFile, IsAlwaysUnlocked) {
+TEST_F(AssetFile, IsUnlockedAfterEachOperation) {
     AssetIDDetails element;
     expectUnlocked();
     element.flushAssetData();

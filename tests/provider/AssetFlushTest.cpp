@@ -12,7 +12,7 @@ using testing::ElementsAre;
 struct TextSetter {
     const char* name;
     void (AssetIDDetails::*set)(const std::string&);
-    std::size_t getter;  ///< index in the list of getters
+    std::size_t getter;  ///< index in stringGetters or dateGetters
 };
 
 const TextSetter textSetters[] = {
@@ -66,7 +66,7 @@ TEST_F(AssetFlush, WritesEachChangedStringWithItsKey) {
         (element.*setter.set)("new text");
         const TextGetter& getter = stringGetters[setter.getter];
         EXPECT_EQ(valueOf(element, getter), "new text");
-        EXPECT_EQ(file(), "") << "nothing is written before it is flushed";
+        EXPECT_EQ(file(), "") << "nothing is written before flushAssetData()";
         element.setPersonalizedData({});
         element.flushAssetData();
         EXPECT_EQ(file(), fixedEntries(getter.key, "new text"));
@@ -130,7 +130,7 @@ TEST_F(AssetFlush, KeepsUnknownKeys) {
               "# by hand\nOTHER.Key=kept\nUSER.Name=Berta\nUSER.PersonalizedLabel6=six\n");
 }
 
-TEST_F(AssetFlush, OverwritesLaterChangesOfTheFileWithTheSnapshot) {
+TEST_F(AssetFlush, OverwritesExternalChangesToTheFileWithTheSnapshot) {
     write(path(), "USER.Name=Anna\nUSER.Phone=1\n");
     AssetIDDetails element;
     write(path(), "USER.Name=Berta\nUSER.Phone=2\n");
@@ -141,7 +141,7 @@ TEST_F(AssetFlush, OverwritesLaterChangesOfTheFileWithTheSnapshot) {
     EXPECT_EQ(valueOf(reread, stringGetters[3]), "3");
 }
 
-TEST_F(AssetFlush, WritesExistingPairsAndKeepsTheOthers) {
+TEST_F(AssetFlush, WritesTheSetPairsAndKeepsTheOthers) {
     const Pairs before = {{"l1", "d1"}, {"l2", "d2"}, {"l3", "d3"}, {"l4", "d4"}, {"l5", "d5"}};
     write(path(), fixedEntries() + pairEntries(before));
     AssetIDDetails element;

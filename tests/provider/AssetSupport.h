@@ -24,7 +24,7 @@ struct TextGetter {
     const char* key;
 };
 
-/** Stored strings, then stored dates. */
+/** Getters of the stored strings. */
 inline const std::vector<TextGetter> stringGetters = {
     {"getAssetNumber", &AssetIDDetails::getAssetNumber, "USER.AssetNumber"},
     {"getAssetIdTag", &AssetIDDetails::getAssetIdTag, "USER.AssetIdTag"},

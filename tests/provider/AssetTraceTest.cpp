@@ -13,7 +13,7 @@ constexpr const char* assetSource = "AssetIDDetails.cpp";
 
 using AssetTrace = AssetFile;
 
-TEST_F(AssetTrace, LogsTheFilePath) {
+TEST_F(AssetTrace, LogsTheCreationOfTheFile) {
     const AssetIDDetails element;
     EXPECT_THAT(logMessagesOf(assetSource, "getFileName"),
                 ElementsAre(entering("getFileName", assetSource),

@@ -1,4 +1,4 @@
-// The adapter of the computer end, which returns the instances of another provider unchanged.
+// The adapter for the computer end of associations, which returns the instances of another provider unchanged.
 
 #include <cmpift.h>
 #include <gmock/gmock.h>
@@ -43,7 +43,7 @@ public:
         states.at(index) = state;
     }
 
-    /** Status codes of the enumeration and of all instances from now on. */
+    /** Status codes that getNext and getObjectPath return from now on. */
     CMPIrc nextStatus = CMPI_RC_OK;
     CMPIrc pathStatus = CMPI_RC_OK;
 
@@ -157,7 +157,7 @@ TEST_F(ComputerSystemAdapter, HasNoInstanceAfterTheLast) {
     }
 }
 
-TEST_F(ComputerSystemAdapter, OmitsTheLastInALoopOverItsCondition) {
+TEST_F(ComputerSystemAdapter, OmitsTheLastInstanceInALoopOverItsCondition) {
     Manager manager(3);
     CMPILAWComputerSystem adapter(manager.broker(), manager.context(), "root/cimv2");
     adapter.setObjectPath(manager.classPath());
@@ -215,7 +215,7 @@ TEST_F(ComputerSystemAdapter, HasNoInstanceIfTheNextCannotBeRead) {
     EXPECT_EQ(adapter.getCMPIInstance(nullptr), manager.instance(1));
 }
 
-TEST_F(ComputerSystemAdapter, HasNoPathIfTheInstanceReturnsNone) {
+TEST_F(ComputerSystemAdapter, HasNoPathIfTheInstanceReportsAFailure) {
     Manager manager(1);
     CMPILAWComputerSystem adapter(manager.broker(), manager.context(), "root/cimv2");
     adapter.setObjectPath(manager.classPath());

@@ -4,7 +4,7 @@
 #include "RecordKinds.h"
 #include "Warranty.h"
 
-/** Parameters of typed tests: the two elements over record stores. */
+/** Parameters of typed tests: the two elements with record stores. */
 namespace providerTest {
 
 struct LeaseElementKind {

@@ -1,4 +1,4 @@
-// Log records of the elements over record stores.
+// Log records of the elements with record stores.
 
 #include <gmock/gmock.h>
 

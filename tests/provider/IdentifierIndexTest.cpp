@@ -20,7 +20,7 @@ protected:
         index.update(table);
     }
 
-    /** All positions with an identifier, found one after the other. */
+    /** Searches for all records with an identifier, one after the other. Returns their positions. */
     std::vector<std::size_t> positions(const std::string& identifier) const {
         std::vector<std::size_t> found;
         for (std::size_t next = 0; (next = index.find(table, identifier, next)) != index.none; ++next) {
@@ -49,7 +49,7 @@ TEST_F(IdentifierIndexTest, FindsRecordsOfOneIdentifierInTableOrder) {
     EXPECT_EQ(positions("a"), Positions{});
 }
 
-TEST_F(IdentifierIndexTest, StartsAtAnyPosition) {
+TEST_F(IdentifierIndexTest, CanStartASearchAtAnyPosition) {
     append({"A", "B", "A", "C", "A"});
     EXPECT_EQ(index.find(table, "A", 1), 2U);
     EXPECT_EQ(index.find(table, "A", 2), 2U);
@@ -64,7 +64,7 @@ TEST_F(IdentifierIndexTest, OmitsDeletedRecords) {
     EXPECT_EQ(positions("A"), (Positions{2}));
 }
 
-/** A record that counts how often an index reads whether it is in use. */
+/** A record type that counts the reads of its inUse flag. */
 struct CountingRecord {
     struct Flag {
         bool value;
@@ -101,7 +101,7 @@ TEST_F(IdentifierIndexTest, FindsAppendedRecords) {
     }
 }
 
-TEST_F(IdentifierIndexTest, SearchesTheTableUntilItIsUpdated) {
+TEST_F(IdentifierIndexTest, FindsRecordsThatWereAppendedSinceTheLastUpdate) {
     append({"A", "B"});
     table.push_back(LeaseUnit("C"));
     table.push_back(LeaseUnit("A"));

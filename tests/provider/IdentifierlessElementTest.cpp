@@ -1,9 +1,9 @@
-// An element over a store whose records have no identifier.
+// An element with a store whose records have no identifier.
 
 #include "ElementKinds.h"
 #include "RecordElementImpl.h"
 
-// Not in an unnamed namespace, since the explicit instantiations below define unused operations too.
+// These types are not in an unnamed namespace, since the explicit instantiations below also define unused operations.
 namespace providerTest {
 
 /** A store with one record that has no properties. */
@@ -20,7 +20,7 @@ public:
     bool getProperty(Property, std::string&) const { return false; }
 };
 
-/** The names of an element over that store. */
+/** Traits with this store and with the names of an element. */
 template <class Element>
 struct Identifierless {
     using Base = IdentifierlessBase;
@@ -69,14 +69,14 @@ TYPED_TEST(IdentifierlessElement, ThrowsWhenComparedWithAnIdentifier) {
               TypeParam::refusal);
     EXPECT_EQ(thrown<InstrumentationException>([&] { element.evaluate(); }), TypeParam::refusal);
     const auto records = recordsOf(TypeParam::sourceFile, "evaluate");
-    ASSERT_EQ(records.size(), 4U) << "two entries and no exit";
+    ASSERT_EQ(records.size(), 4U) << "an entry and a message per call, and no exit";
     for (const std::size_t failed : {1U, 3U}) {
         EXPECT_EQ(withoutLine(records[failed].text), message(TypeParam::refusal, TypeParam::sourceFile));
         EXPECT_EQ(records[failed].level, 3000);
     }
 }
 
-TYPED_TEST(IdentifierlessElement, PassesFiltersOfAnotherType) {
+TYPED_TEST(IdentifierlessElement, MatchesFiltersOfAnotherType) {
     typename TypeParam::Element element;
     element.setFilter(static_cast<typename TypeParam::Element::FilterType>(3), "any");
     EXPECT_TRUE(element.evaluate());

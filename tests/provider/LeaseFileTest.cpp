@@ -1,4 +1,4 @@
-// Properties of the lease file only: four flags and the order of the thirteen lines.
+// Tests what only the lease file contains: four flags and the order of its thirteen lines.
 
 #include <iterator>
 
@@ -74,7 +74,7 @@ TEST_F(LeaseFile, StoresFlagsAsOneOrZero) {
     }
 }
 
-/** Returns a file of two records and replaces one line of the first. */
+/** Returns a file of two records, with one line of the first record replaced. */
 std::string damaged(std::size_t line, const std::string& text) {
     std::vector<std::string> lines = {
         "A", "Ay", "20240101000000.000000+000", "1", "1", "1", "1", "1", "11", "12", "13", "14", "2"};
@@ -86,7 +86,7 @@ std::string damaged(std::size_t line, const std::string& text) {
     return content + "B\nBee\n20250101000000.000000+000\n3\n0\n0\n0\n0\n21\n22\n23\n24\n4\n";
 }
 
-/** Expects that reading stopped in the first record after the term and this number of flags. */
+/** Expects that reading stopped in the first record, with this term and after this number of flags. */
 void expectStopped(const LeaseCache& cache, unsigned int leaseTerm, std::size_t flagsRead) {
     ASSERT_EQ(cache.recordCountLease, 2U);
     ASSERT_EQ(cache.table.size(), 2U);
@@ -138,7 +138,7 @@ TEST_F(LeaseFile, ReadsLeadingDigitsOfANumberAndTheRestAsTheNextField) {
 
 TEST_F(LeaseFile, RepeatsValuesOfThePrecedingRecordAfterReadingStops) {
     std::string content = damaged(12, "2");
-    content.replace(content.find("\n23\n"), 4, "\n");  // one line less, so the last number is missing
+    content.replace(content.find("\n23\n"), 4, "\n");  // one line fewer, so that the last number is missing
     const auto cache = load(content);
     const LeaseUnit& second = cache->table.at(1);
     EXPECT_EQ(second.InstanceID, "B");

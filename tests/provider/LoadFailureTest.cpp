@@ -1,4 +1,4 @@
-// Failures of the framework while loading. The program replaces PlatformUtilities::getKelsaDataDir.
+// Failures of the framework while records are loaded. The test program replaces PlatformUtilities::getKelsaDataDir.
 
 #include <gmock/gmock.h>
 
@@ -9,7 +9,7 @@
 
 namespace {
 
-/** Throws instead of returning the data directory; null for none. */
+/** A function that throws an exception instead of returning the data directory; null if there is none. */
 void (*insteadOfDataDirectory)() = nullptr;
 
 }  // namespace

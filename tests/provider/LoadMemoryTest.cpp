@@ -1,5 +1,5 @@
-// Loading with little memory. The program replaces sysconf and operator new, including its nothrow variant, since the
-// operator delete below cannot release memory from a sanitizer's variant.
+// Loads records with little memory. The test program replaces sysconf and operator new, including its nothrow variant,
+// since the operator delete below cannot release memory from a sanitizer's variant.
 
 #include <dlfcn.h>
 #include <gmock/gmock.h>
@@ -15,7 +15,7 @@ namespace {
 
 constexpr std::size_t unlimited = std::numeric_limits<std::size_t>::max();
 
-/** Physical memory in pages, 0 for that of the machine, and the minimum size of allocations that fail. */
+/** Physical memory in pages, or 0 for the machine's memory; and the minimum size of allocations that fail. */
 long physicalPages = 0;
 std::size_t refusedSize = unlimited;
 
@@ -63,7 +63,7 @@ protected:
         RecordStore<Kind>::TearDown();
     }
 
-    /** Limits the physical memory to about a number of records. @return the exact number of records that fit */
+    /** Limits the physical memory to about `count` records. @return the exact number of records that fit */
     static std::size_t limitMemoryToRecords(std::size_t count) {
         const auto page = static_cast<std::size_t>(sysconf(_SC_PAGESIZE));
         physicalPages = static_cast<long>(count * sizeof(Unit) / page + 1);
@@ -78,7 +78,10 @@ protected:
         return content;
     }
 
-    /** Loads the file. Expects an empty table and exactly one record at error level per channel, which reports that. */
+    /**
+     * Loads a file with this content. Expects an empty table, and per channel one log record at error level with the
+     * reason.
+     */
     static void expectTooLarge(const std::string& content) {
         write(RecordStore<Kind>::path(), content);
         agentEnvironment::forgetLog();
@@ -102,12 +105,12 @@ protected:
 
 TYPED_TEST_SUITE(LoadMemory, RecordKinds, KindNames);
 
-TYPED_TEST(LoadMemory, LogsACountOfRecordsThatExceedsMemory) {
+TYPED_TEST(LoadMemory, LogsThatTheRecordsExceedMemory) {
     const std::size_t fitting = this->limitMemoryToRecords(40);
     this->expectTooLarge(this->fileOf(fitting + 1));
 }
 
-TYPED_TEST(LoadMemory, LogsACountOfCopiesThatExceedsMemory) {
+TYPED_TEST(LoadMemory, LogsThatCopiesOfTheLastRecordExceedMemory) {
     const std::size_t fitting = this->limitMemoryToRecords(40);
     this->expectTooLarge(std::to_string(fitting) + "\n" + std::string(1000, 'x'));
 }
@@ -117,7 +120,7 @@ TYPED_TEST(LoadMemory, LogsAFailedAllocation) {
     this->expectTooLarge(this->fileOf(200));
 }
 
-TYPED_TEST(LoadMemory, LoadsAllRecordsIfMemoryIsTooSmallForTheReserve) {
+TYPED_TEST(LoadMemory, LoadsAllRecordsIfMemoryIsTooSmallForTheReservedCapacity) {
     const std::size_t fitting = this->limitMemoryToRecords(40);
     const auto cache = this->load(this->fileOf(fitting));
     EXPECT_EQ(TypeParam::count(*cache), fitting);
@@ -125,7 +128,7 @@ TYPED_TEST(LoadMemory, LoadsAllRecordsIfMemoryIsTooSmallForTheReserve) {
     EXPECT_EQ(cache->table.back().InstanceID, "R" + std::to_string(fitting - 1));
 }
 
-TYPED_TEST(LoadMemory, LoadsAllRecordsIfTheAllocationOfTheReserveFails) {
+TYPED_TEST(LoadMemory, LoadsAllRecordsIfReservingMemoryFails) {
     refusedSize = 200 * sizeof(typename TypeParam::Unit) + 1;
     const auto cache = this->load(this->fileOf(200));
     EXPECT_EQ(TypeParam::count(*cache), 200U);

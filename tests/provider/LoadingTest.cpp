@@ -1,4 +1,4 @@
-// Loading record files with any content, which never fails.
+// Loads record files with arbitrary content. Loading never fails.
 
 #include <gmock/gmock.h>
 #include <unistd.h>
@@ -44,7 +44,7 @@ TYPED_TEST(Loading, OfAMissingFileYieldsAnEmptyTableAndCreatesNoFile) {
     EXPECT_FALSE(std::filesystem::exists(this->path()));
 }
 
-/** Expects every property accessor to throw this message. */
+/** Expects every property accessor to throw an exception with this message. */
 template <class Kind>
 void expectNoProperty(typename Kind::Base& base, const std::string& refusal) {
     std::string text = "before";
@@ -78,7 +78,7 @@ TYPED_TEST(Loading, OfAMissingFileLeavesCursorsAtTheEnd) {
     EXPECT_FALSE(std::filesystem::exists(this->path()));
 }
 
-TYPED_TEST(Loading, OfACountOfZeroEqualsAMissingFile) {
+TYPED_TEST(Loading, OfACountOfZeroYieldsAnEmptyTable) {
     for (const char* content : {"0\n", "0", "0\nA\nB\n", "  \n\n0\n"}) {
         this->expectEmpty(*this->load(content));
     }
@@ -95,7 +95,7 @@ TYPED_TEST(Loading, YieldsTheRecordsInFileOrder) {
     EXPECT_THAT(this->identifiers(*cache), ElementsAre("C", "A", "B"));
 }
 
-TYPED_TEST(Loading, ReservesTenRecordsOrTwiceTheCount) {
+TYPED_TEST(Loading, ReservesMemoryForTenRecordsOrTwiceTheCount) {
     EXPECT_GE(this->load("0\n")->table.capacity(), 10U);
     EXPECT_GE(this->load("11\n")->table.capacity(), 22U);
 }

@@ -3,7 +3,7 @@
 #include <string>
 #include <vector>
 
-/** A logging library that stores all records, regardless of their level. */
+/** Test double of the logging library. Stores all records, regardless of their level. */
 namespace logDouble {
 
 /** The message of each record, prefixed with its channel: "log" or "trace". */

@@ -29,7 +29,7 @@ TEST(LoggerNames, OfAgentAndAssetElementsAreShorter) {
     }
 }
 
-TEST(LoggerNames, OfAllOtherFilesAreTheProviders) {
+TEST(LoggerNames, OfAllOtherFilesEqualTheProvidersName) {
     for (const std::string* name :
          {&loggerLeaseAndWarrantyProvider, &loggerLeaseBase, &loggerWarrantyBase, &loggerLease, &loggerWarranty,
           &loggerLeaseSetting, &loggerWarrantySetting, &loggerCMPILAWComputerSystem, &loggerCMPILeaseSetting,

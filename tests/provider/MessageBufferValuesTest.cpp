@@ -20,7 +20,7 @@ using KO::LeaseWarrantyProvider::LeaseUnit;
 using KO::LeaseWarrantyProvider::WarrantyUnit;
 namespace Properties = KO::LeaseWarrantyProvider::Properties;
 
-/** Returns a value inserted after a label and before another value, as in a parameter list. */
+/** Formats a parameter list that contains a value twice. */
 template <class Value>
 std::string listed(const Value& value) {
     RZMessageBuffer buffer;

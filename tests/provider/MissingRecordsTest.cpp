@@ -10,7 +10,7 @@ using namespace providerTest;
 using testing::ElementsAre;
 using testing::IsEmpty;
 
-/** A record class, its count, and the exception message for a wrong count. */
+/** A record class, its count, and the source file, function and message of the exception for a wrong count. */
 struct CountedStore {
     const char* className;
     unsigned int& count;
@@ -33,7 +33,7 @@ protected:
         store.count = 1;
         EXPECT_EQ((this->*request)(store.className), CMPI_RC_OK);
         store.count = 0;
-        EXPECT_THAT(events, IsEmpty()) << "nothing is returned, and no done";
+        EXPECT_THAT(events, IsEmpty()) << "neither results nor their end are returned";
         EXPECT_THAT(errorsOf(store.storeFile, store.cursor), ElementsAre(message(store.noRecords, store.storeFile)));
         EXPECT_THAT(errorsOf(entryFile, entryPoint), ElementsAre(message(store.noRecords, entryFile)));
         EXPECT_EQ(logMessages().back(), std::string(78, '='));

@@ -1,4 +1,4 @@
-// An unnamed computer before and after those that are searched.
+// An unnamed computer that precedes or follows the computer that is searched for.
 
 #include "SettingKinds.h"
 

@@ -6,7 +6,10 @@
 
 namespace providerTest {
 
-/** Replaces the nodes of this process's agent while it exists. The program must link koframework_objects. */
+/**
+ * Replaces the nodes of this process's agent during the lifetime of this object. The program must link
+ * koframework_objects.
+ */
 class ProcessNodes {
 public:
     explicit ProcessNodes(const std::string& toml);
@@ -21,7 +24,7 @@ private:
 /** @name Nodes as TOML fragments */
 ///@{
 extern const char* const assetNodes;    ///< computers with every form of product name
-extern const char* const settingNodes;  ///< computers whose paths contain escaped characters, and two of one name
+extern const char* const settingNodes;  ///< computers whose paths need escaping, and two computers with the same name
 ///@}
 
 }  // namespace providerTest

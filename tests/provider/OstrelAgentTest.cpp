@@ -4,7 +4,7 @@
 #include "OstrelAgent.h"
 #include "Support.h"
 
-/** Contains letters, to test case-sensitivity. */
+/** Contains letters, to test case sensitivity. */
 const char* const agentVersion = "4.2.0-Beta";
 
 namespace {
@@ -50,7 +50,7 @@ TEST_F(OstrelAgentElement, DescribesTheAgentProduct) {
     EXPECT_EQ(agent.getStatus(), "OK");
 }
 
-TEST_F(OstrelAgentElement, HasASuffixIfTheMarkerFileExists) {
+TEST_F(OstrelAgentElement, HasANameSuffixIfTheMarkerFileExists) {
     const OstrelAgent agent;
     write(marker(), "whatever");
     EXPECT_EQ(agent.getName(), "Test Agent Tarvik Agent");
@@ -62,7 +62,7 @@ TEST_F(OstrelAgentElement, HasASuffixIfTheMarkerFileExists) {
     EXPECT_EQ(agent.getProductName(), "Test Agent");
 }
 
-TEST_F(OstrelAgentElement, HasNoSuffixIfAFileWithAnotherNameExists) {
+TEST_F(OstrelAgentElement, HasNoNameSuffixIfAFileWithAnotherNameExists) {
     const auto other = agentEnvironment::installDirectory() / "version.LV1";
     write(other, "");
     EXPECT_EQ(OstrelAgent().getName(), "Test Agent");

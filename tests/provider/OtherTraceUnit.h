@@ -1,4 +1,4 @@
 #pragma once
 
-/** Returns the result of another translation unit's formatting function. */
+/** Formats a trace line in another translation unit. */
 const char* traceOfOtherUnit(const char* function);

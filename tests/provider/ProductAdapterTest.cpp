@@ -1,4 +1,4 @@
-// The adapters of the agent and of the asset identification, constructed from a namespace.
+// The adapters of the agent and of asset data, constructed from a namespace.
 
 #include <gmock/gmock.h>
 
@@ -25,7 +25,7 @@ class ProductAdapter : private ProcessNodes, public CleanAgent {
 protected:
     ProductAdapter() : ProcessNodes(assetNodes) {}
 
-    /** The values of a key, and the namespaces, of an adapter's paths. */
+    /** The namespaces and the values of a key in an adapter's paths, and the number of its instances. */
     struct VisitedPaths {
         std::vector<std::string> keys{};
         std::vector<std::string> nameSpaces{};
@@ -64,7 +64,7 @@ TEST_F(ProductAdapter, OfANamespaceReturnsOneAssetInstancePerComputer) {
     const VisitedPaths found = visited<CMPIAssetIDDetail>("Name");
     EXPECT_THAT(found.keys, ElementsAre("spaced", "tight", "dashless", "dash first", "dash second", "many dashes",
                                         "empty", "productless", "/system%20one"))
-        << "the last has no name and repeats the preceding key";
+        << "the last computer has no name, and its Name key repeats the preceding key";
     EXPECT_THAT(found.nameSpaces, Each("root/elsewhere"));
     EXPECT_EQ(found.instances, 9U);
     EXPECT_THAT(logMessagesOf("AssetIDDetails.cpp", "setFilter"), IsEmpty());

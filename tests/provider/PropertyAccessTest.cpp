@@ -1,4 +1,4 @@
-// Reading and writing every property number with every type.
+// Reads and writes each property number with each type.
 
 #include <type_traits>
 #include <variant>
@@ -16,7 +16,7 @@ constexpr const char* wrongTypeOfText = "Incorrect Type or Property or Property 
 template <class Unit>
 using Member = std::variant<std::monostate, std::string Unit::*, unsigned int Unit::*, bool Unit::*>;
 
-/** The member of each property number, starting at 0. Other numbers are invalid. */
+/** Returns the member of each property number, from 0. Other numbers are invalid. */
 template <class Kind>
 std::vector<Member<typename Kind::Unit>> membersByNumber() {
     using Unit = typename Kind::Unit;
@@ -62,7 +62,7 @@ protected:
         return number >= 0 && index < members.size() ? members[index] : Member<Unit>();
     }
 
-    /** Returns the member that a property of a type accesses; null if the access is invalid. */
+    /** Returns the member that a property number accesses with a type; null if the access is invalid. */
     template <class Value>
     static Value Unit::*reached(int number) {
         const Member<Unit> member = memberOf(number);
@@ -105,7 +105,7 @@ protected:
         for (std::size_t index = 0; index < expected.size(); ++index) {
             EXPECT_EQ(Kind::members(this->table()[index]), Kind::members(expected[index])) << index;
         }
-        EXPECT_EQ(std::filesystem::exists(this->path()), writable) << "the file is written after a change only";
+        EXPECT_EQ(std::filesystem::exists(this->path()), writable) << "the file is written only after a change";
     }
 
     template <class Value>
@@ -204,7 +204,7 @@ constexpr bool readsFlags<Base, Property,
                           std::void_t<decltype(std::declval<Base&>().getProperty(Property(), std::declval<bool&>()))>> =
     true;
 
-TEST(WarrantyFlagAccess, IsNotOffered) {
+TEST(WarrantyFlagAccess, DoesNotExist) {
     EXPECT_TRUE((readsFlags<LeaseBase, LeaseKind::Property>));
     EXPECT_FALSE((readsFlags<WarrantyBase, WarrantyKind::Property>));
 }

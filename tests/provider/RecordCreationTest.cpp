@@ -36,7 +36,7 @@ TYPED_TEST(RecordCreation, AppendsARecordWithDefaults) {
     EXPECT_EQ(TypeParam::members(this->table()[1]), TypeParam::members(expected));
 }
 
-TYPED_TEST(RecordCreation, MovesTheCursorFromARecordToTheNewOne) {
+TYPED_TEST(RecordCreation, MovesTheCursorFromARecordToTheNewRecord) {
     this->fill({"A", "B"});
     typename TypeParam::Base base;
     ++base;
@@ -73,7 +73,7 @@ TYPED_TEST(RecordCreation, MovesTheCursorFromTheEndToADeletedFirstEntry) {
     EXPECT_EQ(this->identifier(base), "C");
 }
 
-TYPED_TEST(RecordCreation, MovesTheCursorFromADeletedRecordToTheNewOne) {
+TYPED_TEST(RecordCreation, MovesTheCursorFromADeletedRecordToTheNewRecord) {
     this->fill({"A"});
     typename TypeParam::Base base;
     TypeParam::remove(base);
@@ -149,7 +149,7 @@ TYPED_TEST(RecordCreation, AndDeletionLeaveOnlyTheCountInTheFile) {
     EXPECT_FALSE(hasCurrent(fresh));
 }
 
-TYPED_TEST(RecordCreation, OfDeletedRecordsIsNotWritten) {
+TYPED_TEST(RecordCreation, AfterDeletionRecordsAreNotWritten) {
     this->fill({"A", "B", "C"});
     {
         typename TypeParam::Base base;

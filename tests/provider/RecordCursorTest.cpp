@@ -92,7 +92,7 @@ TYPED_TEST(RecordCursor, StaysAtTheEndWhenARecordIsAppended) {
     EXPECT_FALSE(hasCurrent(base));
 }
 
-TYPED_TEST(RecordCursor, MovesFromADeletedRecordWhenItIsTested) {
+TYPED_TEST(RecordCursor, MovesFromADeletedRecordWhenItsConditionIsEvaluated) {
     this->fill({"A", "B", "C"});
     typename TypeParam::Base base;
     this->markDeleted(0);
@@ -179,7 +179,7 @@ TYPED_TEST(RecordCursor, StaysAtTheEndWhenSelecting) {
     EXPECT_TRUE(this->atEnd(base));
 }
 
-TYPED_TEST(RecordCursor, IsNotAffectedByRecordsThatAnotherCursorAppends) {
+TYPED_TEST(RecordCursor, KeepsItsPositionWhenAnotherCursorAppendsRecords) {
     this->fill({"A", "B"});
     typename TypeParam::Base base;
     ++base;
@@ -193,7 +193,7 @@ TYPED_TEST(RecordCursor, IsNotAffectedByRecordsThatAnotherCursorAppends) {
     EXPECT_EQ(this->visited(base).size(), 101U);
 }
 
-TYPED_TEST(RecordCursor, SeesChangesOfAnotherCursorAtOnce) {
+TYPED_TEST(RecordCursor, SeesChangesByAnotherCursorAtOnce) {
     this->fill({"A"});
     typename TypeParam::Base first;
     typename TypeParam::Base second;

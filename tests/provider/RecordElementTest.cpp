@@ -88,7 +88,7 @@ TYPED_TEST(RecordElement, FindsARecordWithAnEmptyIdentifier) {
     EXPECT_EQ(this->identifier(element), "");
 }
 
-TYPED_TEST(RecordElement, PassesNoRecordThroughTwoDifferentFilters) {
+TYPED_TEST(RecordElement, VisitsNoRecordWithTwoDifferentIdentifierFilters) {
     this->fill({"L1", "L2"});
     typename TypeParam::Element element;
     element.setFilter(TypeParam::Element::InstanceIDFilter, "L1");
@@ -113,7 +113,7 @@ TYPED_TEST(RecordElement, FiltersFromTheCurrentRecord) {
     EXPECT_FALSE(hasCurrent(element));
 }
 
-TYPED_TEST(RecordElement, PassesEveryRecordThroughAFilterOfAnotherType) {
+TYPED_TEST(RecordElement, VisitsEveryRecordWithAFilterOfAnotherType) {
     this->fill({"L1", "x", "L2"});
     this->markDeleted(1);
     typename TypeParam::Element element;
@@ -121,7 +121,7 @@ TYPED_TEST(RecordElement, PassesEveryRecordThroughAFilterOfAnotherType) {
     EXPECT_THAT(this->visited(element), ElementsAre("L1", "L2"));
 }
 
-TYPED_TEST(RecordElement, SkipsRecordsThatDoNotPass) {
+TYPED_TEST(RecordElement, SkipsRecordsThatDoNotMatch) {
     this->fill({"same", "other", "same", "other"});
     typename TypeParam::Element element;
     element.setFilter(this->other, "anything");
@@ -149,7 +149,7 @@ TYPED_TEST(RecordElement, EvaluatesTheCurrentRecord) {
     EXPECT_FALSE(element.evaluate());
 }
 
-TYPED_TEST(RecordElement, EvaluatesNothingAtTheEnd) {
+TYPED_TEST(RecordElement, ThrowsWhenAFilterIsEvaluatedAtTheEnd) {
     typename TypeParam::Element element;
     EXPECT_TRUE(element.evaluate());
     element.setFilter(TypeParam::Element::InstanceIDFilter, "L1");
@@ -185,7 +185,7 @@ TYPED_TEST(RecordElement, RemovesNothingWithoutAFilter) {
     EXPECT_FALSE(std::filesystem::exists(this->path()));
 }
 
-TYPED_TEST(RecordElement, ChecksForAFilterBeforeARecord) {
+TYPED_TEST(RecordElement, ChecksForAFilterBeforeItChecksForARecord) {
     typename TypeParam::Element element;
     EXPECT_EQ(thrown<InstrumentationException>([&] { TypeParam::remove(element); }), this->identify());
 }
@@ -204,7 +204,7 @@ TYPED_TEST(RecordElement, RemovesTheRecordOfTheFilterAndRewritesTheFile) {
               std::string("2\nW0\n") + TypeParam::Store::defaultRecord + "W2\n" + TypeParam::Store::defaultRecord);
 }
 
-TYPED_TEST(RecordElement, RemovesTheCurrentRecordThroughAFilterOfAnotherType) {
+TYPED_TEST(RecordElement, RemovesTheCurrentRecordWithAFilterOfAnotherType) {
     this->fill({"L1", "L2"});
     typename TypeParam::Element element;
     element.setFilter(this->other, "anything");
@@ -214,7 +214,7 @@ TYPED_TEST(RecordElement, RemovesTheCurrentRecordThroughAFilterOfAnotherType) {
     EXPECT_EQ(this->identifier(element), "L2");
 }
 
-TYPED_TEST(RecordElement, RemovesNothingWhenNoRecordPasses) {
+TYPED_TEST(RecordElement, RemovesNothingIfNoRecordMatches) {
     this->fill({"L1"});
     typename TypeParam::Element element;
     element.setFilter(TypeParam::Element::InstanceIDFilter, "L2");

@@ -188,7 +188,7 @@ TYPED_TEST(RecordFile, ReadsARecordFromTheStreamsPosition) {
     EXPECT_EQ(next, "next");
 }
 
-TYPED_TEST(RecordFile, KeepsMissingFieldsUnchanged) {
+TYPED_TEST(RecordFile, KeepsTheValuesOfMissingFieldsWhenReading) {
     for (const char* text : {"before_reading", "*", "_", "plain", ""}) {
         typename TypeParam::Unit before(text);
         before.*TypeParam::date().member = text;
@@ -210,7 +210,7 @@ TYPED_TEST(RecordFile, KeepsMissingFieldsUnchanged) {
     }
 }
 
-TYPED_TEST(RecordFile, KeepsInUseOfTheRecordReadInto) {
+TYPED_TEST(RecordFile, KeepsTheInUseFlagWhenReading) {
     write(this->path(), std::string("A\n") + TypeParam::defaultRecord);
     std::ifstream stream(this->path());
     typename TypeParam::Unit unit;

@@ -107,7 +107,7 @@ struct KindNames {
     }
 };
 
-/** Messages and names of a kind of record, which differ in one word. */
+/** Messages and names of a record kind. The two kinds differ in one word. */
 template <class Kind>
 struct Words {
     static std::string with(const std::string& before, const std::string& after) { return before + Kind::name + after; }
@@ -175,7 +175,7 @@ protected:
     static std::filesystem::path path() { return agentEnvironment::dataDirectory() / Words<Kind>::fileName; }
     static std::string file() { return contentOf(path()); }
 
-    /** Loads a file with that content. */
+    /** Loads a file with this content. */
     static std::unique_ptr<Cache> load(const std::string& content) {
         write(path(), content);
         return std::make_unique<Cache>();
@@ -210,7 +210,7 @@ inline std::vector<std::string> linesOf(const std::string& text) {
             line += byte;
         }
     }
-    EXPECT_EQ(line, "") << "the last line is not ended";
+    EXPECT_EQ(line, "") << "the last line has no line feed";
     return lines;
 }
 

@@ -1,4 +1,4 @@
-// The named properties of leases and warranties.
+// Tests the getters and setters of leases and warranties.
 
 #include "ElementKinds.h"
 
@@ -61,8 +61,8 @@ protected:
     using Unit = typename Kind::Store::Unit;
 
     /**
-     * Expects that the property is set in the current record only and is read back, and that both accessors throw at
-     * the end.
+     * Expects that the setter changes only the current record, that the getter returns the new value, and that both
+     * throw at the end.
      */
     template <class Value>
     void expectProperty(const PropertyRow<Element, Unit, Value>& row, const Value& stored) {
@@ -90,7 +90,7 @@ protected:
 using LeaseProperties = RecordProperties<LeaseElementKind>;
 using WarrantyProperties = RecordProperties<WarrantyElementKind>;
 
-TEST_F(LeaseProperties, HaveTheirOwnAccessors) {
+TEST_F(LeaseProperties, AreSetAndReturnedByTheirAccessors) {
     for (const auto& row : leaseStrings) {
         expectProperty(row, std::string("some text"));
     }
@@ -102,7 +102,7 @@ TEST_F(LeaseProperties, HaveTheirOwnAccessors) {
     }
 }
 
-TEST_F(WarrantyProperties, HaveTheirOwnAccessors) {
+TEST_F(WarrantyProperties, AreSetAndReturnedByTheirAccessors) {
     for (const auto& row : warrantyStrings) {
         expectProperty(row, std::string("some text"));
     }
@@ -145,7 +145,7 @@ TYPED_TEST(CommonProperties, HaveAnElementName) {
     EXPECT_EQ(text, std::string(TypeParam::Store::name) + " Information");
 }
 
-TYPED_TEST(CommonProperties, HaveNoOtherValuesAndKeepTheArguments) {
+TYPED_TEST(CommonProperties, WithoutValuesReturnFalseAndKeepTheArguments) {
     this->fill({"A"});
     const typename TypeParam::Element element;
     std::string text = "before";
@@ -158,7 +158,7 @@ TYPED_TEST(CommonProperties, HaveNoOtherValuesAndKeepTheArguments) {
     EXPECT_EQ(type, 7);
 }
 
-TYPED_TEST(CommonProperties, HaveTheIdentifier) {
+TYPED_TEST(CommonProperties, HaveAnIdentifier) {
     this->fill({"lease 1"});
     typename TypeParam::Element element;
     std::string text;

@@ -119,7 +119,7 @@ TYPED_TEST(Rewrite, ReplacesTheContentOfTheFile) {
     EXPECT_EQ(this->file(), this->fileWith("ACME"));
 }
 
-TYPED_TEST(Rewrite, IncludesChangesOfOtherCursors) {
+TYPED_TEST(Rewrite, IncludesChangesByOtherCursors) {
     this->fill({"A"});
     typename TypeParam::Base longLived;
     this->change(longLived, "ACME");
@@ -218,7 +218,7 @@ TYPED_TEST(Rewrite, ThatFailsDuringUnwindingIsOnlyLogged) {
     EXPECT_EQ(this->table().at(0).*TypeParam::textMember, "ACME");
 }
 
-/** Runs an action during the unwinding of an unrelated exception, as an object manager may. */
+/** Runs an action while an unrelated exception unwinds the stack, as can happen in an object manager. */
 template <class Action>
 void whileUnwinding(Action action) {
     struct AtEnd {
@@ -274,7 +274,7 @@ TYPED_TEST(Rewrite, HappensDuringUnwinding) {
     EXPECT_EQ(this->file(), this->fileWith("ACME"));
 }
 
-TYPED_TEST(Rewrite, ByTheTableThrowsTheSameException) {
+TYPED_TEST(Rewrite, ByFlushCacheThrowsTheSameException) {
     blockWithDirectory(this->path());
     EXPECT_EQ(thrown<InstrumentationException>([] { TypeParam::cache().flushCache(); }), Words<TypeParam>::cannotOpen);
 }

@@ -1,5 +1,5 @@
-// Exceptions of the framework in a moniker operation, and keys that cannot be selected. The program replaces the
-// operations of Moniker that read keys.
+// Tests exceptions that the framework throws in a moniker function, and keys that cannot be selected. The test program
+// replaces the functions of Moniker that read keys.
 
 #include <csignal>
 #include <functional>

@@ -25,11 +25,11 @@ TYPED_TEST(SettingElement, ReturnsTheNameOfThePathsComputer) {
     EXPECT_EQ(this->toComputer({{"InstanceID", "/system/third"}}), (Keys{{"Name", "beta"}}));
 }
 
-TYPED_TEST(SettingElement, ReturnsTheNameOfAnyNode) {
+TYPED_TEST(SettingElement, ReturnsTheNameOfANodeOfAnyType) {
     EXPECT_EQ(this->toComputer({{"InstanceID", "/system"}}), (Keys{{"Name", "the system"}}));
 }
 
-TYPED_TEST(SettingElement, ReturnsTheOriginalComputerFromBothTranslations) {
+TYPED_TEST(SettingElement, ReturnsTheOriginalComputerAfterTranslationInBothDirections) {
     for (const char* name : {"alpha", "beta"}) {
         EXPECT_EQ(this->toComputer(this->toElement({{"Name", name}})), (Keys{{"Name", name}}));
     }
@@ -41,7 +41,7 @@ TYPED_TEST(SettingElement, ReturnsTheEmptyPathForAnUnknownComputer) {
     }
 }
 
-TYPED_TEST(SettingElement, FindsAKeyAfterOthers) {
+TYPED_TEST(SettingElement, FindsAKeyAfterOtherKeys) {
     EXPECT_EQ(this->toElement({{"CreationClassName", "alpha"}, {"Name", "beta"}}),
               (Keys{{"InstanceID", "/system/second%5Fbox"}}));
     EXPECT_EQ(this->toComputer({{"Name", "x"}, {"ElementName", "y"}, {"InstanceID", "/system/third"}}),
@@ -66,7 +66,7 @@ TYPED_TEST(SettingElement, RejectsALeaseOrWarrantyWithoutItsKey) {
     }
 }
 
-TYPED_TEST(SettingElement, RejectsAPathWithoutANodeOrToAnUnnamedNode) {
+TYPED_TEST(SettingElement, RejectsThePathOfAMissingOrUnnamedNode) {
     for (const char* path : {"", "/system/fourth", "/SYSTEM", "/system/first box ", "/system/fan", "lease 1"}) {
         EXPECT_EQ(thrown<InstrumentationException>([&] {
                       this->toComputer({{"InstanceID", path}});
@@ -76,7 +76,7 @@ TYPED_TEST(SettingElement, RejectsAPathWithoutANodeOrToAnUnnamedNode) {
     }
 }
 
-TYPED_TEST(SettingElement, SelectsAgainInEachCall) {
+TYPED_TEST(SettingElement, SearchesAgainInEachCall) {
     EXPECT_EQ(this->toElement({{"Name", "beta"}}), (Keys{{"InstanceID", "/system/second%5Fbox"}}));
     EXPECT_EQ(this->toElement({{"Name", "alpha"}}), (Keys{{"InstanceID", "/system/first%20box"}}));
     EXPECT_EQ(this->toComputer({{"InstanceID", "/system"}}), (Keys{{"Name", "the system"}}));
@@ -85,7 +85,7 @@ TYPED_TEST(SettingElement, SelectsAgainInEachCall) {
     EXPECT_EQ(this->toComputer({{"InstanceID", "/system/third"}}), (Keys{{"Name", "beta"}}));
 }
 
-TYPED_TEST(SettingElement, SelectsAgainRegardlessOfTheCurrentRecord) {
+TYPED_TEST(SettingElement, SearchesAgainRegardlessOfTheCurrentRecord) {
     this->fill({"/system/first%20box", "unrelated", "/system/second%5Fbox"});
     typename TypeParam::Setting fresh;
     const auto toElement = [&](const char* name) {

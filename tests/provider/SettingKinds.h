@@ -64,7 +64,7 @@ inline Keys keysOf(Moniker moniker) {
     return keys;
 }
 
-/** A setting element over empty stores, with operations on keys. */
+/** A setting element with empty stores. Its translations take and return keys. */
 template <class Kind>
 class SettingElement : private ProcessNodes, public RecordStore<typename Kind::Store> {
 protected:

@@ -12,7 +12,7 @@ using namespace providerTest;
 using testing::ElementsAre;
 using testing::ElementsAreArray;
 
-/** Level and message of a record. */
+/** Level and message of a log record. */
 struct LoggedRecord {
     int level;
     std::string text;
@@ -25,7 +25,7 @@ struct LoggedRecord {
 template <class Kind>
 class SettingTrace : public SettingElement<Kind> {
 protected:
-    /** Returns the records that a function logged. Expects the source file's logger. */
+    /** Returns the log records of a function. Expects that they use the source file's logger. */
     static std::vector<LoggedRecord> loggedBy(const std::string& function) {
         std::vector<LoggedRecord> found;
         for (const LogRecord& record : recordsOf(Kind::sourceFile, function)) {

@@ -16,7 +16,7 @@ namespace providerTest {
 
 using agentEnvironment::LogRecord;
 
-/** The file of the entry points in the log, and the line before and after each request. */
+/** The source file of the entry points, and the line before and after each request in the log. */
 constexpr const char* entryFile = "LeaseAndWarrantyProvider.cpp";
 inline const std::string rule(78, '=');
 
@@ -49,13 +49,16 @@ std::string thrown(Operation operation) {
     return {};
 }
 
-/** Returns whether a cursor has a current object. Its operator bool may move it, so test assertions cannot call it. */
+/**
+ * Returns whether a cursor has a current object. The cursor's operator bool can move the cursor, so test assertions
+ * cannot call it.
+ */
 template <class Cursor>
 bool hasCurrent(Cursor& cursor) {
     return cursor;
 }
 
-/** Replaces line numbers in a trace message by N. */
+/** Replaces line numbers in a trace message with N. */
 inline std::string withoutLine(const std::string& text) {
     static const std::regex number("(\\[Line: |, Line: |at line )[0-9]+");
     return std::regex_replace(text, number, "$1N");
@@ -84,7 +87,7 @@ inline std::vector<LogRecord> recordsOf(const std::string& file, const std::stri
     return found;
 }
 
-/** Returns their messages without line numbers. */
+/** Returns the messages of the records of a function, without line numbers. */
 inline std::vector<std::string> logMessagesOf(const std::string& file, const std::string& function) {
     std::vector<std::string> found;
     for (const LogRecord& record : recordsOf(file, function)) {
@@ -95,7 +98,7 @@ inline std::vector<std::string> logMessagesOf(const std::string& file, const std
 
 /**
  * Returns the messages that a function of a source file logs during an operation. Expects the provider's logger, the
- * flow level and a line.
+ * flow level and a line number.
  */
 template <class Operation>
 std::vector<std::string> flowLoggedBy(const std::string& file, const std::string& function, Operation operation) {
@@ -109,7 +112,7 @@ std::vector<std::string> flowLoggedBy(const std::string& file, const std::string
     return logMessagesOf(file, function);
 }
 
-/** Return the entry and exit messages of a function. A parameter list must start with a blank. */
+/** Return the entry and exit messages of a function. A parameter list must start with a space. */
 inline std::string entering(const std::string& function, const std::string& file, const std::string& list = {}) {
     return "ENTERING: " + function + "() in " + file + " [Line: N]" +
            (list.empty() ? std::string() : ",Parameters List: " + list);

@@ -20,7 +20,7 @@ struct KindRow {
     const char* withList;
 };
 
-/** Prints the number. GoogleTest would print all bytes, including uninitialized padding. */
+/** Prints the kind. By default, GoogleTest prints all bytes, including uninitialized padding. */
 void PrintTo(const KindRow& row, std::ostream* stream) {
     *stream << row.kind;
 }
@@ -118,7 +118,7 @@ TEST(TraceFormat, KeepsStringsOf511Characters) {
     EXPECT_EQ(trace((text + "x").c_str(), "A.cpp", 1, KO::MT_MESSAGE), head + text);
 }
 
-TEST(TraceFormat, WritesOnlyToItsOwnBuffer) {
+TEST(TraceFormat, WritesEachFunctionsResultToItsOwnBuffer) {
     const char* const list = tracepara("f", "A.cpp", 1, "list", KO::MT_EXITING);
     const char* const text = trace("v", "A.cpp", 1, "text");
     const char* const number = trace("v", "A.cpp", 1, 5U);

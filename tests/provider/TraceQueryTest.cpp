@@ -46,7 +46,7 @@ protected:
     int timesFormatted = 0;
 };
 
-TEST_F(TraceQuery, DoesNotFormatUnwantedLines) {
+TEST_F(TraceQuery, DoesNotFormatLinesThatAreNotAdmitted) {
     logDouble::admittedLevel = Level::flow - 1;
     traceEverything();
     EXPECT_THAT(logDouble::records, IsEmpty());

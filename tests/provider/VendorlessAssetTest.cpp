@@ -1,4 +1,4 @@
-// A system without a vendor: filters pass if their property cannot be read.
+// A system without a vendor. A filter matches if its property cannot be read.
 
 #include "AssetSupport.h"
 
@@ -23,7 +23,7 @@ protected:
     VendorlessAsset() : AssetFile(vendorlessNodes) {}
 };
 
-TEST_F(VendorlessAsset, PassesEveryVendorFilter) {
+TEST_F(VendorlessAsset, MatchesEveryVendorFilter) {
     for (const char* vendor : {"Computer Maker", "another maker", ""}) {
         AssetIDDetails element;
         element.setFilter(AssetIDDetails::FILTER_VENDOR, vendor);
@@ -32,7 +32,7 @@ TEST_F(VendorlessAsset, PassesEveryVendorFilter) {
     }
 }
 
-TEST_F(VendorlessAsset, FailsOtherFilters) {
+TEST_F(VendorlessAsset, DoesNotMatchAFilterForAnotherName) {
     AssetIDDetails element;
     element.setFilter(AssetIDDetails::FILTER_VENDOR, "another maker");
     element.setFilter(AssetIDDetails::FILTER_NAME, "otherhost");

@@ -1,4 +1,4 @@
-// Properties of the warranty file only: the order of the four lines.
+// Tests what only the warranty file contains: the order of its four lines.
 
 #include "RecordKinds.h"
 
