@@ -78,8 +78,8 @@ public:
     void remove(const LocalObject& keys);
 
     /**
-     * Releases the lock for a call of the object manager that may take long or lead back to the gate. Another request
-     * may load the provider again meanwhile.
+     * Releases the lock during a call to the object manager, which may take a long time or call the gate again. Another
+     * request may load the provider again meanwhile.
      */
     template <class Work>
     void releaseFor(Work work) {

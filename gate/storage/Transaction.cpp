@@ -135,7 +135,7 @@ void Transaction::requireTable() const {
     theConnection.tableOf(requested)->isVerified = true;
 }
 
-/** Stores records that are only in memory, since their file was removed, by setting a value to itself. */
+/** Makes the provider write a record file that was removed: sets a property of a record to its current value. */
 void Transaction::storeTable(const CMPIObjectPath* record) const {
     const LocalObject changed = localPath(record, requested);
     const auto* number = std::find_if(requested.begin(), requested.end(), [](const Property& property) {
