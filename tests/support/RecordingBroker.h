@@ -120,7 +120,7 @@ public:
     /** Uses the function tables of an object manager: versions, functions that are null. */
     void emulate(Manager manager);
 
-    /** Sets the known classes. Their new instances have their keys as properties. */
+    /** Sets the known classes. A new instance of a known class has the keys of its path as properties. */
     void know(cimhost::ClassInfoLookup classes);
     ///@}
 

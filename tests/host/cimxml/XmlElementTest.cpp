@@ -38,7 +38,7 @@ TEST(XmlElementTest, DocumentsAreUtf8WhateverTheyDeclare) {
     EXPECT_NE(reasonFor("<?xml version=\"1.0\" encoding=\"UTF-7\"?><A X+AD0-'1'/>"), "accepted");
 }
 
-TEST(XmlElementTest, EncodingsThatTheFirstBytesShowAreRefused) {
+TEST(XmlElementTest, Utf16IsRefusedAndAByteOrderMarkOfUtf8IsAccepted) {
     using namespace std::string_literals;
     for (const std::string& utf16 : {"\xFF\xFE<\0A\0/\0>\0"s, "<\0?\0x\0m\0l\0"s, "\xFE\xFF\0<\0A\0/\0>"s}) {
         EXPECT_THAT(reasonFor(utf16), HasSubstr("not UTF-8"));

@@ -90,7 +90,7 @@ TEST_F(RecordingBrokerTest, FailsEveryCallUntilItObeys) {
     EXPECT_EQ(result->ft->returnDone(result).rc, CMPI_RC_OK);
 }
 
-TEST_F(RecordingBrokerTest, FailingGettersAnswerNothing) {
+TEST_F(RecordingBrokerTest, FailingGettersReturnZeroOrABadValue) {
     const CMPIObjectPath* path = newPath();
     recorder.failEvery("CMPIObjectPathFT.getKeyCount", CMPI_RC_ERR_FAILED);
     EXPECT_EQ(path->ft->getKeyCount(path, &status), 0U);

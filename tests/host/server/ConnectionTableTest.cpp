@@ -190,7 +190,7 @@ TEST_F(ConnectionTableTest, AHeadIsNotAsOldAsThatOfTheRequestBefore) {
     EXPECT_TRUE(client.isOpen());
 }
 
-TEST_F(ConnectionTableTest, EachPhaseHasALimit) {
+TEST_F(ConnectionTableTest, EachPhaseExceptWorkHasATimeLimit) {
     limits.connections = 10;
     limits.connectionsPerAddress = 10;
     const Added& idle = addIn(Phase::idle);
