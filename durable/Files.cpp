@@ -83,8 +83,8 @@ public:
     }
 
     /**
-     * Copies owner, group and mode of a model as far as permitted. If the group cannot be copied, only the new owner has
-     * access. A file of another user keeps its mode. If there is no model, copies owner and group of the directory.
+     * Copies owner, group and mode of a model as far as permitted. If the group cannot be copied, only the new owner
+     * has access. A file of another user keeps its mode. If there is no model, copies owner and group of the directory.
      */
     void beLike(const std::string& model) const {
         struct stat found {};
