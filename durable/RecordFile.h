@@ -39,7 +39,7 @@ public:
     /** The number of declared records whose lines are all present. */
     std::size_t presentIn(std::string_view content) const;
 
-    /** Whether the content has all declared records, a line feed at its end and no null bytes. Ignores more lines. */
+    /** Whether the content has all declared records, no null bytes and a line feed at its end. Ignores extra lines. */
     bool isComplete(std::string_view content) const;
 
     /**

@@ -57,7 +57,7 @@ CMPIStatus guarded(Broker broker, Work work) {
     }
 }
 
-/** A function of an interface. It runs an operation. */
+/** Implements a function of an interface: runs an operation and converts its exceptions. */
 template <auto operation, class Interface, class... Arguments>
 CMPIStatus runOperation(Interface*, const CMPIContext* context, const CMPIResult* result, const CMPIObjectPath* path,
                         Arguments... arguments) {

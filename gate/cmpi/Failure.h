@@ -15,7 +15,7 @@ struct Failure {
     std::string message;
 };
 
-/** Exception that ends a request whose object manager, with its broker, must not be used any more. */
+/** Exception that ends a request because its object manager is ending or has ended. Do not use its broker any more. */
 struct ManagerGone {
     static void throwUnless(bool mayBeUsed) {
         if (!mayBeUsed) {

@@ -27,7 +27,7 @@ constexpr std::chrono::milliseconds pollInterval{10};
 /** How long a request waits for newer records if older ones suffice. File times have a resolution of up to 10 ms. */
 constexpr std::chrono::milliseconds newerTimeout{50};
 
-/** Waits with the lock released while a condition is true, at most until the timeout. Returns whether it still is. */
+/** Waits with the lock released while a condition holds, at most for the timeout. Returns whether it still holds. */
 template <class Condition>
 bool waitWhile(LockGuard& guard, std::chrono::milliseconds timeout, Condition condition) {
     const auto end = std::chrono::steady_clock::now() + timeout;

@@ -119,7 +119,7 @@ void DataFile::rollBack(const std::string& before) const {
     if (hasRecords) {
         records().restore(before);
     } else if (state().content != before) {
-        const std::string path = std::filesystem::canonical(pathOf(*this));  // of a link: the target is replaced
+        const std::string path = std::filesystem::canonical(pathOf(*this));  // if it is a link, replaces its target
         durable::replaceFile(path, before, path);
         durable::syncDirectoryOf(path);
     }

@@ -59,7 +59,7 @@ void Transaction::run(const FileState& before, Change change) const {
     }
 }
 
-/** Restores the file, which the next request makes the provider read. Returns a note for the client if that fails. */
+/** Restores the file and marks the provider as outdated. Returns a note for the client if the file is not restored. */
 std::string Transaction::rollBack(const std::string& restorable) const {
     try {
         if (file.hasRecords && !restorable.empty()) {
