@@ -6,12 +6,11 @@
 #include <string>
 
 // Safe calls to CMPI objects of an object manager. Managers leave functions out of their tables and return null
-// pointers, so these functions check both.
+// pointers, so these functions check for both.
 
 namespace cim {
 
-/** The result and the status of a function call. A missing function returns a zero value and CMPI_RC_ERR_NOT_SUPPORTED.
- */
+/** The result and the status of a call; a zero value and CMPI_RC_ERR_NOT_SUPPORTED if the function is missing. */
 template <class Value>
 struct Answer {
     Value value;
@@ -41,7 +40,7 @@ CMPIStatus tell(Object* object, Arguments... arguments) {
     return (object->ft->*function)(object, arguments...);
 }
 
-/** Calls one of the broker's functions that create objects. Returns null if the status is an error. */
+/** Calls one of the broker's functions that create objects. Returns null if it is missing or its status is an error. */
 template <auto function, class... Arguments>
 auto make(const CMPIBroker* broker, Arguments... arguments) {
     CMPIStatus status{CMPI_RC_OK, nullptr};
@@ -59,20 +58,20 @@ inline std::optional<std::string> charactersOf(const CMPIString* string) {
     return characters != nullptr ? std::optional<std::string>(characters) : std::nullopt;
 }
 
-// Object managers set CMPIData::state differently, so each source of data is read in its own way:
+// Object managers set CMPIData::state differently, so read the data of each function as follows:
 //
 //   getKey, getKeyAt, getProperty, getPropertyAt
-//       Both managers set the state: CMPI_nullValue for a value that is not set, CMPI_notFound (with an error status)
-//       for a name that does not exist, CMPI_keyValue for a key. For a null string, SFCB returns a pointer to a string
-//       object without characters; for a missing property, only the state CMPI_notFound. Check in this order: status,
-//       state, type, pointer, characters. See hasValue().
+//       OpenPegasus and SFCB set the state: CMPI_nullValue for a value that is not set, CMPI_notFound (with an error
+//       status) for a name that does not exist, CMPI_keyValue for a key. For a null string, SFCB returns a pointer to a
+//       string object without characters; for a missing property, only the state CMPI_notFound. Check in this order:
+//       status, state, type, pointer, characters. See hasValue().
 //   getNext
 //       OpenPegasus returns every element with the state CMPI_nullValue, SFCB with CMPI_goodValue. Check the status,
 //       the type and the pointer, but never the state. See elementInstance().
 //   Context entries
 //       The provider, the gate and the agent do not read them.
 
-/** Returns whether the data of a key or a property contain a value. CMPI_keyValue is not an error. */
+/** Returns whether the data of a key or property has a value. CMPI_keyValue is not an error. */
 inline bool hasValue(const CMPIData& data) {
     constexpr unsigned int flaws = CMPI_nullValue | CMPI_notFound | CMPI_badValue;
     return (data.state & flaws) == 0 && data.type != CMPI_null;
@@ -103,8 +102,8 @@ inline std::optional<std::string> digitsOf(const CMPIData& data) {
 }
 
 /**
- * Returns the characters of a string or datetime, the digits of an integer, "true" or "false" of a boolean. None for
- * another type, and for a null pointer. Ignores the state.
+ * Returns the characters of a string or datetime, the digits of an integer, "true" or "false" for a boolean; none for
+ * another type or a null pointer. Ignores the state.
  */
 inline std::optional<std::string> charactersOf(const CMPIData& data) {
     switch (data.type) {

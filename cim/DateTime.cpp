@@ -9,14 +9,14 @@
 namespace cim {
 namespace {
 
-/** A function object, which algorithms call inline. */
+/** A function object, so that algorithms inline it. */
 constexpr auto isDigit = [](char c) { return c >= '0' && c <= '9'; };
 
 bool all(std::string_view string, char c) {
     return std::all_of(string.begin(), string.end(), [&](char each) { return each == c; });
 }
 
-/** The value of a field; none if it is asterisks. */
+/** The value of a field; none if the field has asterisks. */
 std::optional<int> number(std::string_view digits) {
     if (!isDigit(digits.front())) {
         return std::nullopt;

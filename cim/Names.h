@@ -20,7 +20,7 @@ inline bool sameName(std::string_view left, std::string_view right) {
            (left == right || std::equal(left.begin(), left.end(), right.begin(), sameLetter));
 }
 
-/** The element of a container whose member `name` equals this name; null if there is none. */
+/** The element of a container whose member `name` is the same name, ignoring letter case; null if there is none. */
 template <class Elements>
 auto* findNamed(Elements& elements, std::string_view name) {
     const auto found = std::find_if(std::begin(elements), std::end(elements),

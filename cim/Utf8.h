@@ -10,11 +10,11 @@
 
 namespace cim {
 
-/** The first character of a string. */
+/** A decoded character. */
 struct Utf8Character {
     std::uint32_t codePoint;  ///< if not valid, the first byte
     std::size_t length;       ///< in bytes; 1 if not valid
-    bool valid;               ///< whether the bytes are the UTF-8 of a Unicode code point
+    bool valid;               ///< whether the bytes are the UTF-8 encoding of a Unicode code point
 };
 
 /** Decodes the first character of a string that is not empty. Overlong forms and surrogates are not valid. */
@@ -46,7 +46,7 @@ inline std::size_t findInvalidUtf8(std::string_view string) {
 /** Length of the invalid bytes at the front of a string: a truncated character, or one byte. */
 inline std::size_t invalidLength(std::string_view string) {
     for (const std::size_t length : {3U, 2U}) {
-        // A prefix of a character is one that continuation bytes complete.
+        // Bytes are a truncated character if continuation bytes complete them to a valid one.
         const std::string completed = std::string(string.substr(0, length)) + "\x80\x80";
         if (string.size() >= length && firstCharacter(completed).valid) {
             return length;

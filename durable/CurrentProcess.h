@@ -4,7 +4,7 @@
 
 namespace durable {
 
-/** The id of this process, also after a fork. Asks the kernel only once per process: each request needs the id. */
+/** The id of this process, also after a fork. Asks the kernel once per process, because each request needs the id. */
 pid_t currentProcess() noexcept;
 
 }  // namespace durable

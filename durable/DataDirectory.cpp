@@ -17,7 +17,7 @@ long long nanosecondsIn(const timespec& time) {
     return time.tv_sec * second + time.tv_nsec;
 }
 
-/** The present time of the clock that file systems use, which advances every few milliseconds. */
+/** The current time of the clock that file systems use. The clock advances every few milliseconds. */
 long long timeOfFiles() {
     timespec now{};
     clock_gettime(CLOCK_REALTIME_COARSE, &now);
@@ -28,7 +28,7 @@ bool isStored(const RecordFile& file) {
     try {
         return file.isStored();
     } catch (const std::system_error&) {
-        return true;  // the file or a copy, which cannot be read
+        return true;  // the file or a copy exists, but cannot be read
     }
 }
 
@@ -44,7 +44,7 @@ bool needsRecovery(const RecordFile& file) {
     try {
         return file.needsRecovery();
     } catch (const std::system_error&) {
-        return isIncomplete(file);  // there is a copy, which this process cannot read
+        return isIncomplete(file);  // a file exists that this process cannot read, such as a copy
     }
 }
 
@@ -52,7 +52,7 @@ bool needsRecovery(const RecordFile& file) {
 
 bool DataDirectory::open() {
     const bool hadOtherOwner = hasOtherOwner;
-    hasOtherOwner = true;  // if an exception leaves the question open
+    hasOtherOwner = true;  // stays true if an exception is thrown
     acquireLock();
     if (isOwner()) {
         recover();
@@ -60,7 +60,8 @@ bool DataDirectory::open() {
     const long long now = timeOfFiles();
     const Stamp current = stamp();
     remember(current);
-    // A file that is written again at the time of its last change would seem unchanged. A later time is a wrong one.
+    // Another write with the same file time would not be detected, so that time must have passed. A time more than a
+    // second ahead is ignored as wrong.
     const bool isSettled = std::none_of(current.begin(), current.end(),
                                         [&](const auto& file) { return file[2] >= now && file[2] < now + second; });
     const bool isReadable = isOwner() || (isSettled && !needRecovery());
@@ -93,7 +94,7 @@ std::array<std::optional<std::size_t>, recordFileCount> DataDirectory::recordCou
     return counts;
 }
 
-/** Without effect if a file cannot be read or written: then its copies stay in use. */
+/** Stops at a file that cannot be read or written: its copies stay marked as in use. */
 void DataDirectory::finish() const {
     try {
         for (const RecordFile& file : recordFilesIn(path())) {
@@ -131,11 +132,11 @@ bool DataDirectory::exists() const {
 
 DataDirectory::Ownership DataDirectory::acquire() {
     const bool hadOtherOwner = hasOtherOwner;
-    hasOtherOwner = true;  // if an exception leaves the question open
+    hasOtherOwner = true;  // stays true if an exception is thrown
     const DirectoryLock::Result result = acquireLock();
     const bool isOther = result.state == DirectoryLock::State::heldByOther;
     const Stamp now = stamp();
-    // Without record files and copies, the provider's records are the only ones.
+    // Without record files and copies, no other owner has stored records.
     hasOtherOwner = hadOtherOwner || (result.state == DirectoryLock::State::acquired && hasStored(now));
     remember(now);
     return {isOwner(), isOther,
@@ -164,7 +165,7 @@ void DataDirectory::recover() const {
             done = file.recover();
         } catch (const std::system_error& error) {
             if (access(file.path().c_str(), R_OK | W_OK) == 0) {
-                throw;  // the provider would read an incomplete file, and a change would write that
+                throw;  // the provider would read an incomplete file, and a change would make the loss permanent
             }
             done = std::string("A record file cannot be read and written. ") + error.what();
         }

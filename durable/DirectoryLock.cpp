@@ -15,7 +15,7 @@ namespace durable {
 
 namespace {
 
-/** A lock of all bytes of the file. */
+/** A lock on all bytes of a file. */
 struct flock lockOfFile() {
     struct flock lock {};
     lock.l_type = F_WRLCK;
@@ -33,7 +33,7 @@ int tryLock(int descriptor) {
     return error;
 }
 
-/** The result of a failed try. Errors of file systems without locks are those of an unknown operation. */
+/** The state after a failed attempt. File systems without locks return the errors of an unsupported operation. */
 DirectoryLock::State stateAfter(int error) {
     if (error == EACCES || error == EAGAIN) {
         return DirectoryLock::State::heldByOther;
@@ -43,8 +43,8 @@ DirectoryLock::State stateAfter(int error) {
 }
 
 /**
- * Whether the file must not be written. A user of the directory could otherwise let a process of root change a file
- * elsewhere, to which that user has added the name "owner".
+ * Whether the file must not be written, because it is not a regular file or has another name. Otherwise, a user who may
+ * write to the directory could make "owner" a hard link to a file elsewhere, which a process of root would change.
  */
 bool isForeign(int descriptor) {
     struct stat file {};
@@ -69,7 +69,7 @@ DirectoryLock::Result DirectoryLock::acquire(const std::string& directory) {
     if (isHeldIn(path)) {
         return {State::held};
     }
-    release();  // inherited from the parent process, or removed from the directory
+    release();  // of a file that was inherited from the parent process, or removed from the directory
     descriptor = open(path.c_str(), O_RDWR | O_CREAT | O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK, 0644);
     const bool isOpen = descriptor >= 0;
     if (isOpen && isForeign(descriptor)) {
@@ -113,10 +113,10 @@ void DirectoryLock::writeOwner() const {
     const std::string owner = std::to_string(process) + " " + program_invocation_short_name + "\n";
     const bool isWritten = ftruncate(descriptor, 0) == 0 &&
                            write(descriptor, owner.data(), owner.size()) == static_cast<ssize_t>(owner.size());
-    static_cast<void>(isWritten);  // the lock holds without it
+    static_cast<void>(isWritten);  // the lock does not depend on the content
 }
 
-/** The process id is from the system or, for an owner in another container, from the file, as is the name. */
+/** Takes the process id from the system or, for an owner in another container, from the file. The file has the name. */
 std::string DirectoryLock::ownerOf(const std::string& path) const {
     struct flock lock = lockOfFile();
     const bool isKnown = fcntl(descriptor, F_GETLK, &lock) == 0 && lock.l_type != F_UNLCK && lock.l_pid > 0;

@@ -7,11 +7,11 @@
 namespace durable {
 
 /**
- * The lock by which one process owns a data directory: an advisory record lock on the file "owner" there. The file's
- * content, the process id and the program, is only for messages.
+ * The lock by which one process owns a data directory: an advisory record lock on the file "owner" there. The file
+ * contains the process id and the program name, only for messages.
  *
  * A record lock belongs to the process: it ends with the process, a forked child does not have it, and the system knows
- * its owner. The process also loses it if it closes any descriptor of the file, so no other code may open the file.
+ * its owner. A process also loses the lock when it closes any descriptor of the file, so other code must not open it.
  */
 class DirectoryLock {
 public:
@@ -19,13 +19,13 @@ public:
         held,      ///< since an earlier call
         acquired,  ///< by this call
         heldByOther,
-        denied,       ///< this process must not write the file, it has another name too, or the system failed
+        denied,       ///< this process cannot write the file, the file has another name, or a system call failed
         unavailable,  ///< the directory is missing, or its file system has no locks
     };
 
     struct Result {
         State state;
-        std::string reason{};  ///< the process that holds it, or why it is denied or unavailable
+        std::string reason{};  ///< the process that holds the lock, or why it is denied or unavailable
     };
 
     constexpr DirectoryLock() = default;
@@ -34,8 +34,8 @@ public:
     DirectoryLock& operator=(const DirectoryLock&) = delete;
 
     /**
-     * Acquires the lock, unless this process holds it, and returns at once. Creates the file if it may. Throws
-     * std::system_error if the system lacks resources.
+     * Tries to acquire the lock, unless this process holds it. Does not wait. Creates the file if permitted. Throws
+     * std::system_error if the file cannot be opened because of missing resources or an input/output error.
      */
     Result acquire(const std::string& directory);
 

@@ -83,8 +83,8 @@ public:
     }
 
     /**
-     * Copies owner, group and mode as far as permitted. If the group cannot be copied, only the new owner has access. A
-     * file of another user keeps its mode. Without a model, copies owner and group of the directory.
+     * Copies owner, group and mode of a model as far as permitted. If the group cannot be copied, only the new owner
+     * has access. A file of another user keeps its mode. If there is no model, copies owner and group of the directory.
      */
     void beLike(const std::string& model) const {
         struct stat found {};
@@ -98,7 +98,7 @@ public:
         }
     }
 
-    /** Removes the content if that is possible. */
+    /** Removes the content if possible. */
     void clear() const {
         const bool isEmpty = ftruncate(number, 0) == 0;
         static_cast<void>(isEmpty);
@@ -115,7 +115,7 @@ private:
     const int number;
 };
 
-/** Creates or truncates a file. @param flags more flags of open() */
+/** Creates or overwrites a file, and syncs it. @param flags additional flags for open() */
 void writeFile(const std::string& path, int flags, std::string_view content, const std::string& model) {
     const Descriptor file(path, O_WRONLY | O_CREAT | O_TRUNC | O_NOFOLLOW | O_NONBLOCK | flags, 0600);
     require(file.isOpen(), path);
@@ -124,7 +124,7 @@ void writeFile(const std::string& path, int flags, std::string_view content, con
         file.writeAll(content);
         file.sync();
     } catch (...) {
-        file.clear();  // it may be complete, but not on the disk
+        file.clear();  // the content may be complete without being on the disk
         throw;
     }
 }

@@ -22,7 +22,7 @@ namespace {
 
 struct Format {
     const char* fileName;
-    const char* afterDate;  ///< the last lines of a record without values
+    const char* afterDate;  ///< the lines after the date in a record without values
 };
 
 constexpr Format formats[recordFileCount] = {
@@ -39,7 +39,7 @@ std::string_view withoutLeadingSpace(std::string_view content) {
     return content.substr(std::min(content.find_first_not_of(" \t\n\v\f\r"), content.size()));
 }
 
-/** The number of lines that end. */
+/** The number of lines that end with a line feed. */
 std::size_t endedLinesIn(std::string_view content) {
     return static_cast<std::size_t>(std::count(content.begin(), content.end(), '\n'));
 }
@@ -88,7 +88,7 @@ std::size_t RecordFile::presentIn(std::string_view content) const {
 
 bool RecordFile::isComplete(std::string_view content) const {
     const auto declared = declaredIn(content);
-    const bool hasHoles = content.find('\0') != std::string_view::npos;  // left by a file system that lost power
+    const bool hasHoles = content.find('\0') != std::string_view::npos;  // left by a power failure
     const bool hasEnd = declared == 0U || endsWith(content, "\n");
     return declared && !hasHoles && hasEnd && presentIn(content) == *declared;
 }
@@ -184,7 +184,7 @@ std::string RecordFile::recover() const {
     const std::string state = defect();
     if (state.empty()) {
         if (const SavedCopies::Copy copy = savedCopy(); !copy.content.empty()) {
-            syncFile(copy.path);  // the process that wrote it may have ended before its sync
+            syncFile(copy.path);  // the process that wrote it may have ended before it synced it
         }
         copies.finishRestoring();
         return {};

@@ -12,59 +12,59 @@ namespace durable {
 
 /**
  * A record file of the provider, and the files beside it that protect it. The provider truncates and rewrites a record
- * file in place, so a process or machine that ends meanwhile leaves an incomplete one.
+ * file in place, so a process that is killed meanwhile, or a power failure, leaves an incomplete file.
  *
  * | File | Content |
  * |---|---|
- * | NAME.saved1, NAME.saved2 | copies; the newer one has the records after the last answered change |
+ * | NAME.saved1, NAME.saved2 | copies; the newer one has the records after the last change that was answered OK |
  * | NAME.damaged | the last content of NAME that the saved copy replaced, or that could not be restored |
  *
- * A change is prepare(), the provider's writing, and commit() or restore(). Functions throw std::system_error if a file
- * cannot be read or written. Only the owner of the directory may call those that write.
+ * A change consists of prepare(), a write by the provider, and commit() or restore(). Functions throw std::system_error
+ * if a file cannot be read or written. Only the owner of the directory may call functions that write.
  */
 class RecordFile {
 public:
-    /** @param newRecord the lines of a record without values, from the end of its identifier */
+    /** @param newRecord the characters that follow the identifier in a record without values */
     RecordFile(const std::string& directory, const char* fileName, const std::string& newRecord);
 
     /** The path of the file, or of its target if it is a symbolic link. */
     const std::string& path() const { return file; }
 
-    /** The content, without the last line of a copy that was restored; none if there is no file. */
+    /** The content; none if there is no file. Omits the last line of a restored copy. */
     std::optional<std::string> content() const;
 
-    /** The number of records that the first line promises; none if it is not an unsigned 32-bit number. */
+    /** The number of records that the first line declares; none if it has no unsigned 32-bit number. */
     static std::optional<std::size_t> declaredIn(std::string_view content);
 
-    /** The number of records whose lines are all there. */
+    /** The number of declared records whose lines are all present. */
     std::size_t presentIn(std::string_view content) const;
 
-    /** Whether the content has the declared records and its last line ends. Later lines do not matter. */
+    /** Whether the content has all declared records, no null bytes and a line feed at its end. Ignores extra lines. */
     bool isComplete(std::string_view content) const;
 
     /**
-     * Ensures that the latest copy has the current records: those of the file or, if that is incomplete, of the
-     * existing copy. A missing or empty file without a copy has none, and is created. From then until finish(), the
-     * copies are in use: recover() discards a record without values that was added since, because the provider writes
-     * such a record before its values.
+     * Ensures that the latest copy has the current records: those of the file or, if the file is incomplete, of the
+     * existing copy. If there is neither a content nor a copy, saves a copy without records, and creates a missing
+     * file. From then until finish(), the copies are in use: recover() discards a last record without values that the
+     * copy lacks, because the provider writes a new record before its values.
      * @param current the content of the file; empty if there is none
-     * @return what restore() needs; empty for an incomplete file without a copy
+     * @return the argument for restore(); empty for an incomplete file without a copy
      */
     std::string prepare(const std::string& current) const;
 
     /**
-     * Writes the file to the disk, then its records to a copy. After that the change may be answered.
-     * @param written the content, which is complete
+     * Syncs the file, then saves a copy. After that, the change can be answered.
+     * @param written the content of the file, which is complete
      */
     void commit(std::string_view written) const;
 
-    /** Restores the file after a change. @param before the result of prepare(), not empty */
+    /** Rolls a change of the file back. @param before the result of prepare(), not empty */
     void restore(const std::string& before) const;
 
-    /** Marks the copies as no longer in use, if they have the records of the file. */
+    /** Marks the copies as no longer in use, if the newer one has the records of the file. */
     void finish() const;
 
-    /** A sentence about a file that is missing, incomplete or has an intermediate state; empty for another one. */
+    /** A message that the file is missing, is incomplete or has an unfinished change; empty if it has no defect. */
     std::string defect() const;
 
     /** Whether the file or a copy has content. Otherwise the provider's records, if any, are only in memory. */
@@ -73,34 +73,35 @@ public:
     /** Whether the file has a defect, and there is a copy. */
     bool needsRecovery() const;
 
-    /** The newer copy. Without a complete one, its content is empty. */
+    /** The newer copy. Its content is empty if there is no complete copy. */
     SavedCopies::Copy savedCopy() const;
 
     /**
-     * Replaces the file, complete or not, by the saved copy, and keeps it as NAME.damaged.
-     * @return a message with the time of the copy; empty, and nothing is changed, if there is no complete copy
+     * Replaces the file, complete or not, by the saved copy. Keeps the former file as NAME.damaged, unless it is empty.
+     * Does nothing if there is no complete copy.
+     * @return a message with the time of the copy; empty if there is none
      */
     std::string restoreSaved() const;
 
     /**
-     * Restores a file that needsRecovery() from the saved copy. Without a saved copy, keeps a copy of an incomplete
-     * file that is not empty. Ends a restoration and the writing of a copy that an earlier process has not ended. Call
-     * it before the provider is loaded and reads its files.
-     * @return a message for the log; empty if the file was complete
+     * Restores a file that needsRecovery() from the saved copy. Without a saved copy, keeps an incomplete file that is
+     * not empty also as NAME.damaged. Finishes a restoration and the sync of a copy that an earlier process has left
+     * unfinished. Call it before the provider is loaded and reads its files.
+     * @return a message for the log; empty if the file was complete, or if there is neither a file nor a copy
      */
     std::string recover() const;
 
     /**
-     * Replaces the content of a file without defect: at any time, it has the old or the new records. Until the next
-     * change, the saved copy has the old ones, and is not in use.
+     * Replaces the records of a file that has no defect. At any time, the file has either the old or the new records.
+     * Until the next change, the saved copy has the old records, and is not in use.
      */
     void replace(std::string_view records) const;
 
 private:
-    /** The same as prepare(). @param isInUse whether changes follow */
+    /** Implements prepare(). @param isInUse whether changes follow */
     std::string save(const std::string& current, bool isInUse) const;
 
-    /** Whether a content has one more record than another one, without values at its end. */
+    /** Whether the content declares one more record than the former content, and its last record has no values. */
     bool addsNewRecord(std::string_view content, std::string_view former) const;
 
     std::string countsOf(std::string_view content) const;

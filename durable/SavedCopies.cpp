@@ -16,7 +16,7 @@ namespace {
 
 constexpr std::string_view beginningOfLastLine = "saved copy ";
 
-/** Removes the end of a string if it has that end. */
+/** Removes a suffix from a string. Returns false if the string does not have the suffix. */
 bool removeEnd(std::string_view& content, std::string_view end) {
     const std::size_t start = content.size() - std::min(content.size(), end.size());
     const bool hasEnd = content.substr(start) == end;
@@ -30,7 +30,7 @@ std::string SavedCopies::lastLineAfterNumber(bool isInUse) const {
     return " of " + name + (isInUse ? ", in use" : "") + "\n";
 }
 
-/** The parts of a copy's content, without its path. Empty if it is not complete. */
+/** The copy that has this file content; empty if the content is incomplete. Does not set the path. */
 SavedCopies::Copy SavedCopies::parse(const std::string& content) const {
     Copy copy;
     std::string_view records = content;
@@ -71,7 +71,7 @@ std::array<SavedCopies::Copy, 2> SavedCopies::byAge() const {
 
 void SavedCopies::save(std::string_view content, bool isInUse) const {
     const auto [older, last] = byAge();
-    if (older.content.empty()) {  // its name may not be on the disk yet
+    if (older.content.empty()) {  // its name may be missing on the disk
         createFile(older.path, 0600);
         syncDirectoryOf(older.path);
     }
@@ -82,17 +82,17 @@ void SavedCopies::save(std::string_view content, bool isInUse) const {
 
 void SavedCopies::restoreLatest() const {
     const Copy last = latest();
-    syncFile(last.path);  // it may be of a process that has ended before
+    syncFile(last.path);  // the process that wrote it may have ended before it synced it
     renameFile(last.path, file);
     syncDirectoryOf(file);
     try {
         finishRestoring();
     } catch (const std::exception&) {
-        return;  // the last line does not matter
+        return;  // readers ignore the last line
     }
 }
 
-/** The last line is removed after the older copy: until then, it proves that the file is newer. */
+/** Removes the last line after the older copy: until then, the line shows that the file is newer than the copy. */
 void SavedCopies::finishRestoring() const {
     const std::string content = readFile(file).value_or(std::string());
     const std::size_t size = withoutLastLine(content).size();

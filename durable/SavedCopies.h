@@ -8,19 +8,19 @@
 namespace durable {
 
 /**
- * Two copies of the content of a file. Each new copy overwrites the older one, so that the other one is complete
- * meanwhile. This takes one sync, since the names on the disk stay the same.
+ * Two copies of the content of a file. Each new copy overwrites the older one, so that the newer one stays complete
+ * meanwhile. Overwriting takes only one sync, since the directory does not change.
  *
- * A copy ends with a line that has its number and the file's name; a copy that was cut lacks it. All functions throw
- * std::system_error if a file cannot be read or written.
+ * A copy ends with a line that has its number and the file's name; a truncated copy lacks this line. All functions
+ * throw std::system_error if a file cannot be read or written.
  */
 class SavedCopies {
 public:
     struct Copy {
         std::string path{};
         std::string content{};     ///< without the last line; empty if there is no complete copy
-        std::uint64_t number = 0;  ///< one more than that of the preceding copy
-        bool isInUse = false;      ///< whether a process may have begun another change since
+        std::uint64_t number = 0;  ///< one more than the number of the preceding copy
+        bool isInUse = false;      ///< whether a process may have begun another change since the copy was saved
     };
 
     explicit SavedCopies(const std::string& itsFile)
@@ -28,16 +28,16 @@ public:
 
     Copy latest() const { return byAge()[1]; }
 
-    /** The content without the last line of a copy, which a restored file may still have. */
+    /** The content of the file, without the last line of a copy if it has one: a restored file may still have it. */
     std::string withoutLastLine(const std::string& content) const;
 
     /** Writes a copy to the disk. It has the mode, owner and group of the file. */
     void save(std::string_view content, bool isInUse) const;
 
-    /** Makes the latest copy the file, which needs no disk space. Removes the other one if possible. */
+    /** Replaces the file by renaming the latest copy, which needs no disk space. Removes the other copy if possible. */
     void restoreLatest() const;
 
-    /** Removes the copies and then the last line of the file, if it has one: restoreLatest() was not finished. */
+    /** If the file still has the last line of a copy after restoreLatest(), removes the copies, then the line. */
     void finishRestoring() const;
 
 private:

@@ -59,7 +59,7 @@ constexpr std::array<PairKeys, 5> pairKeys{{
     {USER_PERSONALIZED_LABEL5_KEY, USER_PERSONALIZED_DATA5_KEY},
 }};
 
-/** Value of an empty label or data string, so that all five pairs have values. */
+/** Replaces an empty label or data string, so that all five pairs have values. */
 constexpr const char* emptyPersonalized = "Null";
 
 /** The fields before the pairs, in the order in which they are read and written. */

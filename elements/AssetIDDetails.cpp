@@ -266,7 +266,7 @@ bool AssetIDDetails::getProductName(std::string& value) const {
     }
     const std::size_t dash = name.find('-');
     if (dash != std::string::npos) {
-        // Also drops the character before the dash, normally a blank. A leading dash truncates nothing.
+        // Also removes the character before the dash, normally a blank. A name with a leading dash stays unchanged.
         value = dash == 0 ? name : name.substr(0, dash - 1);
     }
     return true;

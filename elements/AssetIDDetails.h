@@ -21,12 +21,12 @@ extern Mutex _fileMutex;
 namespace KO::LeaseWarrantyProvider {
 
 /**
- * The managed element of VELKO_AssetIDDetails: the asset identification of this computer in the agent's property file
- * asset.dat, with properties of the computer and the product.
+ * The managed element of VELKO_AssetIDDetails: the asset identification of this computer, which is in the agent's
+ * property file asset.dat, and properties of the computer and the product.
  *
  * The element is a cursor over the computer nodes of the instrumentation tree, restricted by filters. The asset data
  * are the same for each node. The constructor reads the file into a snapshot, the setters change the snapshot, and
- * flushAssetData writes it to the file.
+ * flushAssetData() writes the snapshot to the file.
  *
  * Failures of the file or its lock are logged and never thrown. If the file could not be read, the getters of stored
  * values return false. Other exceptions of the framework are propagated, for example from creating the cursors, reading
@@ -37,7 +37,7 @@ public:
     /** A label and its data string. */
     using PersonalizedPair = std::pair<std::string, std::string>;
 
-    /** Property that a filter compares. Unnamed values compare like FILTER_IDENTIFYING_NUMBER. */
+    /** Property that a filter compares. Other values compare like FILTER_IDENTIFYING_NUMBER. */
     enum FilterType : int {
         FILTER_IDENTIFYING_NUMBER = 0,
         FILTER_NAME = 1,
@@ -67,10 +67,10 @@ public:
     /** Returns whether there is a current computer node. */
     operator bool() const;
 
-    /** Moves to the next computer node that passes the filters. */
+    /** Moves to the next computer node that passes all filters, or to the end. */
     void operator++();
 
-    /** Adds a filter. Moves to the first node that passes all filters, starting at the current one. */
+    /** Adds a filter. Moves to the first node that passes all filters, starting at the current node, or to the end. */
     void setFilter(FilterType type, std::string value);
 
     /** Returns whether the current node passes all filters. A filter whose property cannot be read passes. */
@@ -83,7 +83,7 @@ public:
     std::wstring getFileName();
 
     /** @name Stored values
-     * Each returns whether the file was read. Dates are CIM datetime strings.
+     * Each getter returns whether the file was read. Dates are CIM datetime strings.
      */
     ///@{
     bool getAssetNumber(std::string& value) const;
@@ -103,7 +103,7 @@ public:
     ///@}
 
     /** @name Values of the computer
-     * Each returns whether the instrumentation has the value, and otherwise leaves the argument unchanged.
+     * Each getter returns whether the instrumentation has the value. If not, it leaves the argument unchanged.
      */
     ///@{
     bool getCSName(std::string& value) const;  ///< name of the computer
@@ -111,8 +111,8 @@ public:
     bool getVendor(std::string& value) const;
 
     /**
-     * Reads the product's name without its suffix: the part of "name - suffix" before the first dash and the character
-     * preceding it. Returns a name that starts with the dash unchanged. If the name has no dash, leaves the argument
+     * Reads the product's name without its suffix: from "name - suffix", removes the first dash, the character before
+     * it and all that follows. Keeps a name that starts with a dash. If the name has no dash, leaves the argument
      * unchanged and returns true.
      */
     bool getProductName(std::string& value) const;
@@ -151,11 +151,11 @@ private:
     void readPersonalizedPairs(PropertyFile& file);
     bool comparedValue(FilterType type, std::string& value) const;
 
-    /** Reads a member if the file was read; a date as its CIM datetime string. Traced under the name of the caller. */
+    /** Reads a member if the file was read; a date as a CIM datetime string. Traced under the name of the caller. */
     template <class Member, class Value>
     bool stored(const CallSite& site, const Member& member, Value& value) const;
 
-    /** Changes a member; a date from its CIM datetime string. Traced under the name of the caller. */
+    /** Changes a member; a date from a CIM datetime string. Traced under the name of the caller. */
     template <class Member, class Value>
     static void store(const CallSite& site, Member& member, const Value& value);
 

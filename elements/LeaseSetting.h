@@ -11,7 +11,7 @@ struct LeaseSettingElementTraits {
     static constexpr const char* constructor = "LeaseSetting";
     static constexpr const char* destructor = "~LeaseSetting";
     static constexpr const char* toElement = "getLeaseMoniker";
-    static constexpr bool toElementExits = false;  // the exit is not traced, unlike that of every other operation
+    static constexpr bool toElementExits = false;  // unlike for every other operation, the exit is not traced
     static constexpr const char* elementLabel = " monikerLease=";
 
     static const TraceSource traceSource;

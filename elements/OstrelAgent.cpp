@@ -20,7 +20,7 @@ const TraceSource traceSource{loggerOstrelAgent, "OstrelAgent.cpp"};
 
 constexpr const char* agentCaption = "VEL Ostrel";
 
-/** Only its existence matters, not its content. */
+/** The marker file's name. Only the existence of the file matters, not its content. */
 constexpr const wchar_t* markerFileName = L"version.lv1";
 constexpr const wchar_t* markedSuffix = L" Tarvik Agent";
 
@@ -32,7 +32,7 @@ std::string displayName() {
     return make_string(name);
 }
 
-/** The value that a filter type is compared with. */
+/** The getter of the value that a filter of a type is compared with. */
 struct ComparedValue {
     OstrelAgent::FilterType type;
     std::string (OstrelAgent::*get)() const;

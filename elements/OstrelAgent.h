@@ -10,7 +10,7 @@ namespace KO::LeaseWarrantyProvider {
  */
 class OstrelAgent {
 public:
-    /** Keys that setFilter checks. Unnamed values are accepted and ignored. */
+    /** Keys that setFilter() checks. It ignores filters with other values of this type. */
     enum FilterType : int {
         FILTER_NAME = 0,
         FILTER_IDENTIFYING_NUMBER = 1,
@@ -29,8 +29,7 @@ public:
     void operator++();
 
     /**
-     * Throws InstrumentationException if the value differs from that of the agent, byte for byte. Otherwise does
-     * nothing.
+     * Throws InstrumentationException unless the value is equal to the agent's, byte for byte. Otherwise does nothing.
      */
     void setFilter(FilterType type, std::string value) const;
 

@@ -31,8 +31,8 @@ struct RecordElementNames {
 /**
  * A cursor over the records of a store in table order, restricted by filters. Base of Lease and Warranty.
  *
- * An element belongs to one request. It starts at the first record; only setFilter and operator++ apply the filters.
- * Changes are visible to all elements at once; the destructor rewrites the record file.
+ * An element belongs to one request. It starts at the first record; only setFilter() and operator++ apply the filters.
+ * Changes are visible to all elements at once. The destructor of an element that changed anything rewrites the file.
  *
  * Traits defines:
  *   Base               the record cursor
@@ -41,7 +41,7 @@ struct RecordElementNames {
 template <class Traits>
 class RecordElement {
 public:
-    /** Property that a filter compares. Filters of unnamed values are stored and match every record. */
+    /** Property that a filter compares. Filters with other values of this type match every record. */
     enum FilterType : int {
         InstanceIDFilter = 0,  ///< the identifier, byte for byte
     };
@@ -52,10 +52,10 @@ public:
         std::string reference;  ///< the required value
     };
 
-    /** Starts at the first record. Throws InstrumentationException if the store does. */
+    /** Starts at the first record in use. Throws InstrumentationException if the constructor of the base does. */
     RecordElement();
 
-    /** Rewrites the file if this element changed anything; that may throw. */
+    /** Rewrites the file if this element changed anything. Throws InstrumentationException if that fails. */
     ~RecordElement() noexcept(false);
     RecordElement(const RecordElement&) = delete;
     RecordElement& operator=(const RecordElement&) = delete;
@@ -66,23 +66,23 @@ public:
     /** Moves to the next record that passes the filters, or to the end. */
     void operator++();
 
-    /** Adds a filter. Moves to the first record that passes all filters, starting at the current one. */
+    /** Adds a filter. Moves to the first record that passes all filters, starting at the current one, or to the end. */
     void setFilter(FilterType type, std::string reference);
 
     /**
-     * Returns whether the current record passes all filters. Throws InstrumentationException if an identifier is
-     * compared and there is no current record.
+     * Returns whether the current record passes all filters. Throws InstrumentationException if there is no current
+     * record and a filter compares the identifier.
      */
     bool evaluate() const;
 
-    /** Creates a record and returns true. Throws InstrumentationException if the identifier exists. */
+    /** Creates a record and returns true. Throws InstrumentationException if a record in use has the identifier. */
     bool create(std::string instanceId);
 
     /** Removes the current record. Throws InstrumentationException if no filter was set or the cursor is at the end. */
     void remove();
 
     /** @name Properties with the same value for every record
-     * A getter that returns false leaves its argument unchanged; the property stays unset.
+     * A getter returns false and leaves its argument unchanged if records do not have the property.
      */
     ///@{
     bool getElementName(std::string& value) const;
@@ -105,8 +105,8 @@ protected:
     void set(const CallSite& site, Property property, const Value& value);
 
     /**
-     * Moves to the first record that passes all filters, starting at the current one. Each record on the way is traced;
-     * if no such trace would be written, uses the index of identifiers.
+     * Moves to the first record that passes all filters, starting at the current one. Traces each record on the way. If
+     * tracing is off, uses the index of identifiers instead.
      */
     void skipToPassing();
 

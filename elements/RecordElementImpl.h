@@ -84,7 +84,7 @@ bool RecordElement<Traits>::getElementName(std::string& value) const {
 
 namespace {
 
-/** Common implementation of the getters of properties that no record has. */
+/** Implements the getters of properties that no record has. */
 bool notAvailable(const CallSite& site) {
     const Traced traced(site);
     return false;

@@ -11,15 +11,15 @@ namespace KO::LeaseWarrantyProvider {
  * and back. A record belongs to a computer if its identifier is the string form of the computer's node path. Base of
  * LeaseSetting and WarrantySetting.
  *
- * A computer's moniker has the key "Name", a record's the key "InstanceID"; both are case-sensitive and other keys are
- * ignored. The operations change only the selection of their argument. They throw FrameworkException if the key is
- * missing, and InstrumentationException if the node has no name or a record's identifier is not the path of a node.
- * They propagate these two classes only; any other exception terminates the process.
+ * A computer's moniker has the key "Name", and a record's moniker has the key "InstanceID". Key names are
+ * case-sensitive, and other keys are ignored. The operations change only the selected key of their argument. They throw
+ * FrameworkException if the key is missing or the process is out of memory, and InstrumentationException if the node
+ * has no name or a record's identifier is not the path of a node. Any other exception terminates the process.
  *
  * Traits defines:
  *   Element                          the element of the records
  *   traceSource                      trace source
- *   constructor, destructor          their names in the log
+ *   constructor, destructor          names of the constructor and the destructor in the log
  *   toElement, toElementExits        name of getElementMoniker() in the log, and whether its exit is traced
  *   elementLabel                     label of the record's moniker
  */

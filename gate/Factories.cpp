@@ -22,7 +22,7 @@ CMPIStatus statusOf(CMPIrc rc, StaticString& message) {
     return {rc, message.handle()};
 }
 
-/** A status with a message that the broker creates; without a broker, the status of a shutdown. */
+/** A status with a message that the broker creates; without a broker, with the message of a shutdown. */
 CMPIStatus statusOf(const CMPIBroker* broker, CMPIrc rc, const char* text, const char* detail = "") noexcept {
     if (broker == nullptr) {
         return statusOf(rc, shuttingDown);
@@ -37,7 +37,7 @@ CMPIStatus statusOf(const CMPIBroker* broker, CMPIrc rc, const char* text, const
 
 /**
  * Converts exceptions to a status.
- * @param broker returns the broker for a message; null if there is none any more
+ * @param broker a function that returns the broker to create a message with, or null if there is none
  */
 template <class Broker, class Work>
 CMPIStatus guarded(Broker broker, Work work) {
@@ -45,7 +45,7 @@ CMPIStatus guarded(Broker broker, Work work) {
         work();
         return {CMPI_RC_OK, nullptr};
     } catch (const abi::__forced_unwind&) {
-        throw;  // ends the thread, and must not be caught
+        throw;  // the thread is being cancelled
     } catch (const ManagerGone&) {
         return statusOf(CMPI_RC_ERR_FAILED, shuttingDown);
     } catch (const Failure& failure) {
@@ -57,7 +57,7 @@ CMPIStatus guarded(Broker broker, Work work) {
     }
 }
 
-/** The function of an interface that runs an operation. */
+/** Implements a function of an interface: runs an operation and converts its exceptions. */
 template <auto operation, class Interface, class... Arguments>
 CMPIStatus runOperation(Interface*, const CMPIContext* context, const CMPIResult* result, const CMPIObjectPath* path,
                         Arguments... arguments) {
@@ -66,12 +66,12 @@ CMPIStatus runOperation(Interface*, const CMPIContext* context, const CMPIResult
     return guarded([&] { return request.brokerOrNull(); },
                    [&] {
                        ManagerGone::throwUnless(active.isAdmitted);
-                       request.broker();  // there must be one
+                       request.broker();  // throws if there is none
                        operation(request, arguments...);
                    });
 }
 
-/** Refuses to be unloaded while idle: the provider's tables hold values that its files lose. */
+/** Refuses to be unloaded while idle, because the provider's tables may have values that its files do not preserve. */
 template <class Interface>
 CMPIStatus cleanUp(Interface*, const CMPIContext* context, CMPIBoolean isTerminating) {
     if (isTerminating == 0) {
@@ -110,7 +110,7 @@ CMPIAssociationMIFT associationFunctions{
 CMPIInstanceMI instanceInterface{nullptr, &instanceFunctions};
 CMPIAssociationMI associationInterface{nullptr, &associationFunctions};
 
-/** Returns an interface once the provider is connected; otherwise null, with the reason in the status. */
+/** Connects the provider and returns an interface. If that fails, returns null, with the reason in the status. */
 template <class Interface>
 Interface* open(const CMPIBroker* broker, CMPIStatus* rc, Interface& interface) {
     const CMPIStatus status = broker == nullptr

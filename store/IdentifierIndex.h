@@ -10,21 +10,21 @@
 namespace KO::LeaseWarrantyProvider {
 
 /**
- * Finds the records of a table by identifier in constant time: a hash table whose chains are in table order. Needs
- * three words per record. An identifier may occur more than once. Deleted records leave their chain when another
- * record is appended to it.
+ * Finds the records of a table by identifier in constant time on average: a hash table whose chains are in table order.
+ * Needs two to four words per record. An identifier may occur more than once. Deleted records are removed from their
+ * chain when another record is appended to it.
  */
 template <class Unit>
 class IdentifierIndex {
 public:
     static constexpr std::size_t none = std::numeric_limits<std::size_t>::max();
 
-    /** Includes the records that were appended to the table. If memory is short, the index stays incomplete. */
+    /** Adds the records that were appended to the table. If the process is out of memory, the index is incomplete. */
     void update(const std::vector<Unit>& table) noexcept;
 
     /**
-     * Returns the position of the first record in use with the identifier, byte for byte, from a position on; `none` if
-     * there is none. Searches the table itself if the index is incomplete.
+     * Returns the position of the first record in use, at or after `from`, whose identifier is equal byte for byte;
+     * `none` if there is none. Searches the table itself if the index is incomplete.
      */
     std::size_t find(const std::vector<Unit>& table, const std::string& identifier, std::size_t from) const;
 
@@ -36,7 +36,7 @@ private:
     }
 
     std::vector<std::size_t> heads{};  ///< first position of each chain
-    std::vector<std::size_t> links{};  ///< per record, the next position of its chain
+    std::vector<std::size_t> links{};  ///< per record, the next position in its chain
 };
 
 template <class Unit>
@@ -68,7 +68,7 @@ void IdentifierIndex<Unit>::append(const std::vector<Unit>& table) {
     *end = position;
 }
 
-/** Leaves room for as many records again. Starts with the last record, so that each is put at the head of its chain. */
+/** Reserves space for twice the records. Starts with the last record, so that each becomes the head of its chain. */
 template <class Unit>
 void IdentifierIndex<Unit>::rebuild(const std::vector<Unit>& table) {
     links.clear();
@@ -98,8 +98,8 @@ std::size_t IdentifierIndex<Unit>::find(const std::vector<Unit>& table, const st
         }
         return position < table.size() ? position : none;
     }
-    // A walk over records with one identifier continues in their chain instead of at its head, unless the last one has
-    // been deleted meanwhile.
+    // If the preceding record has the same identifier and is still in use, the search continues at its link in the
+    // chain instead of at the head.
     const bool continues = from > 0 && from <= table.size() && matches(from - 1);
     position = heads.empty() ? none : continues ? links[from - 1] : heads[chainOf(identifier)];
     while (position != none && (position < from || !matches(position))) {

@@ -14,7 +14,7 @@ template class RecordTrace<LeaseStoreTraits>;
 template class RecordCache<LeaseStoreTraits>;
 template class RecordBase<LeaseStoreTraits>;
 
-/** Defined after the logger's name and the tables, which its constructor uses. */
+/** Defined after the logger's name, the trace source and the names, which its constructor uses. */
 template <>
 LeaseCache RecordBase<LeaseStoreTraits>::cache{};
 

@@ -48,8 +48,8 @@ struct RecordStoreNames {
 };
 
 /**
- * Traces construction and copying of records. An empty base of the record types, which use compiler-generated copying.
- * Does not trace destruction or moves, such as those of a growing table.
+ * Traces construction and copying of records. An empty base of the record types, so that their copy operations can be
+ * compiler-generated. Does not trace destruction or moves, such as those of a growing table.
  *
  * Traits is the traits class of the records' store.
  */
@@ -66,8 +66,9 @@ public:
 };
 
 /**
- * The table of one kind of records and its file. Base of LeaseCache and WarrantyCache. Loaded once, with the library;
- * each change rewrites the file. The count, whose name depends on the kind, is always the number of records in use.
+ * The table of one kind of records and its file, used as LeaseCache and WarrantyCache. The file is loaded once, with
+ * the library, and each request that changes a record rewrites it. The count, whose name depends on the kind, is always
+ * the number of records in use.
  */
 template <class Traits>
 class RecordCache : public Traits::Count {
@@ -102,9 +103,9 @@ private:
  *
  * Traits defines:
  *   Unit, Property     record type and property numbers
- *   Count              base of the table with the record count, returned by count()
+ *   Count              base of RecordCache with the record count, which count() returns
  *   traceSource, names trace source and RecordStoreNames of the store
- *   fields             its table of RecordField, in file order
+ *   fields             table of the records' RecordField, in file order
  */
 template <class Traits>
 class RecordBase {
@@ -127,19 +128,22 @@ public:
     RecordBase(const RecordBase&) = delete;
     RecordBase& operator=(const RecordBase&) = delete;
 
-    /** Returns whether the cursor is at a record in use. Skips deleted records first. */
+    /** Skips deleted records, then returns whether the cursor is at a record in use. */
     operator bool();
 
     /** Moves to the next record in use, or to the end. Does nothing at the end. */
     void operator++();
 
-    /** Moves forward, starting at the current record, to the one with the identifier, byte for byte, or to the end. */
+    /**
+     * Moves to the first record with the identifier, compared byte for byte, starting at the current record. If there
+     * is none, moves to the end.
+     */
     void select(const std::string& instanceId);
 
-    /** Like select, but is not traced. */
+    /** Like select(), but without a trace line. */
     void skipTo(const std::string& instanceId);
 
-    /** Returns whether the movements of a cursor may be traced. */
+    /** Returns whether the current log settings trace the movements of a cursor. */
     bool isTraced() const;
 
     /**
@@ -159,7 +163,7 @@ public:
     /** @name Typed property access
      * Reads or changes a property of the current record, even if that record is deleted. The getters return true.
      * Throws InstrumentationException and changes nothing if the cursor is at the end, if the property has another
-     * type, or if the identifier is set.
+     * type, or if a setter is called for the identifier.
      */
     ///@{
     bool getProperty(Property property, std::string& value) const;

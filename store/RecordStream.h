@@ -7,7 +7,7 @@
 
 namespace KO::LeaseWarrantyProvider {
 
-/** Format of a string in its line of a record file. */
+/** Format of a string in a line of a record file. */
 enum class TextForm {
     identifier,  ///< blanks as underscores; an empty string as an empty line
     value,       ///< blanks as underscores; a string of at most one character as "*"
@@ -51,7 +51,7 @@ void writeEscaped(std::ostream& stream, const std::string& text, TextForm form);
 /** Returns the string that a line of a record file represents. */
 std::string unescaped(const std::string& line, TextForm form);
 
-/** Ends and flushes a line: a record file is flushed line by line. */
+/** Ends a line and flushes the stream, since a record file is written line by line. */
 void endLine(std::ostream& stream);
 
 /** Reads a record's fields in the table's order and unescapes its strings. A missing field keeps its value. */

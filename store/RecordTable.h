@@ -61,7 +61,7 @@ void readRecords(const std::string& path, unsigned int& count, std::vector<Unit>
     bool isAtEnd = false;
     for (unsigned int record = 0; record < declared; ++record) {
         stream >> scratch;
-        if (!isAtEnd && !stream.good()) {  // all further records are copies
+        if (!isAtEnd && !stream.good()) {  // all further records are copies of this one
             isAtEnd = true;
             requireMemory(declared - record, sizeof(Unit) + bytesOfStrings(scratch, fields));
         }
@@ -95,8 +95,8 @@ void loadRecords(const std::string& path, unsigned int& count, std::vector<Unit>
 }
 
 /**
- * Rewrites a record file in place: the count, then each record in use. If memory is short, fails before it opens the
- * file.
+ * Rewrites a record file in place: the count, then each record in use. If the process is out of memory, fails before it
+ * opens the file.
  * @return false if the file cannot be opened for writing; write errors are ignored
  */
 template <class Unit>

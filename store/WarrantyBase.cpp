@@ -14,7 +14,7 @@ template class RecordTrace<WarrantyStoreTraits>;
 template class RecordCache<WarrantyStoreTraits>;
 template class RecordBase<WarrantyStoreTraits>;
 
-/** Defined after the logger's name and the tables, which its constructor uses. */
+/** Defined after the logger's name, the trace source and the names, which its constructor uses. */
 template <>
 WarrantyCache RecordBase<WarrantyStoreTraits>::cache{};
 

@@ -5,17 +5,17 @@
 #include <string>
 #include <utility>
 
-// Failures of requests, and their messages.
+// Exceptions that end requests, and their messages.
 
 namespace gate {
 
-/** Ends a request with a status. The message is for a person who can fix the cause. */
+/** Exception that ends a request with a status. The message is for a person who can fix the cause. */
 struct Failure {
     CMPIrc rc;
     std::string message;
 };
 
-/** Ends a request whose object manager is shutting down or has ended. Its broker must not be used any more. */
+/** Exception that ends a request because its object manager is ending or has ended. Do not use its broker any more. */
 struct ManagerGone {
     static void throwUnless(bool mayBeUsed) {
         if (!mayBeUsed) {
@@ -32,7 +32,7 @@ template <class... Parts>
     throw Failure{rc, std::move(message)};
 }
 
-/** The same if a condition is true. */
+/** Calls fail() if a condition is true. */
 template <class... Parts>
 void failIf(bool isFailure, CMPIrc rc, const Parts&... parts) {
     if (isFailure) {
@@ -40,11 +40,11 @@ void failIf(bool isFailure, CMPIrc rc, const Parts&... parts) {
     }
 }
 
-/** Writes an error to the log and trace of the agent. If the process is out of memory, nothing is written. */
+/** Writes an error to the log and trace of the agent. Ignores exceptions of the logger. */
 void logError(const std::string& message, const char* function = __builtin_FUNCTION(),
               const char* file = __builtin_FILE(), int line = __builtin_LINE());
 
-/** Sets the status of a function that the gate implements for others. They may pass null. */
+/** Sets the status of a CMPI function that the gate implements. The pointer is null if the caller wants no status. */
 inline void setStatus(CMPIStatus* rc, CMPIrc code) {
     if (rc != nullptr) {
         *rc = {code, nullptr};
@@ -52,9 +52,9 @@ inline void setStatus(CMPIStatus* rc, CMPIrc code) {
 }
 
 /**
- * A CMPI string over characters that exist elsewhere, made without a broker and without memory. Releasing and cloning
- * it have no effect. Its handle is the characters: some object managers read a message there instead of through its
- * function table.
+ * A CMPI string that refers to existing characters. It needs no broker and allocates no memory. Releasing it has no
+ * effect, and cloning it returns the same string. Its hdl member points to the characters, because some object managers
+ * read a message there instead of through the function table.
  */
 class StaticString {
 public:

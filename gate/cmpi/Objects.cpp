@@ -53,7 +53,7 @@ CMPIInstance* makeInstance(const CMPIBroker* broker, const CMPIObjectPath* path)
 
 namespace {
 
-/** Whether a value is accepted for a property of a type: managers do not keep types apart strictly. */
+/** Whether a value is accepted for a property of a type. Some object managers change the types of values. */
 bool isConvertible(const CMPIData& data, CMPIType wanted) {
     const bool isString = data.type == CMPI_string || data.type == CMPI_chars;
     return wanted == CMPI_string     ? isString
@@ -62,7 +62,7 @@ bool isConvertible(const CMPIData& data, CMPIType wanted) {
                                      : cim::digitsOf(data).has_value();
 }
 
-/** The number that the digits represent; none if it is out of the range of its type. */
+/** The number that the digits represent; none if it is out of the range of the type. */
 std::optional<CMPIUint32> numberIn(const std::string& digits, CMPIType type) {
     CMPIUint32 number = 0;
     const auto error = std::from_chars(digits.data(), digits.data() + digits.size(), number).ec;
@@ -70,7 +70,7 @@ std::optional<CMPIUint32> numberIn(const std::string& digits, CMPIType type) {
     return error == std::errc() && number <= limit ? std::optional<CMPIUint32>(number) : std::nullopt;
 }
 
-/** Whether the path has this key, with an equal value. */
+/** Whether another path has a key with this name and an equal value. */
 bool sameKey(const CMPIData& key, const char* name, const CMPIObjectPath* other) {
     const auto found = ask<&CMPIObjectPathFT::getKey>(other, name);
     require(found.isOk() || isAbsent(found.status), "return the keys of a path", found.status);
@@ -154,7 +154,7 @@ CMPIData LocalObject::dataOf(Member* member, CMPIValueState state, CMPIrc notFou
         value.string = member->valueString.handle();
     } else if (member->type == CMPI_boolean) {
         value.boolean = member->characters == "true" ? 1 : 0;
-    } else {  // no class has other writable integers
+    } else {  // all writable integers of the classes are uint32
         value.uint32 = numberIn(member->characters, CMPI_uint32).value_or(0);
     }
     return {member->type, state, value};

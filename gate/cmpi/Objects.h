@@ -11,8 +11,8 @@
 #include "Schema.h"
 #include "cim/CmpiAccess.h"
 
-// Calls of the object manager's functions, and of its paths and instances, which it frees when the request ends. Paths
-// and instances of the gate itself.
+// Calls to functions of the object manager and of its paths and instances, which it frees when the request ends. Paths
+// and instances that the gate creates itself.
 
 namespace gate {
 
@@ -20,7 +20,7 @@ using cim::ask;
 using cim::make;
 using cim::tell;
 
-/** The characters of a string; empty if any part of it is missing. */
+/** The characters of a string; empty if the string, its function table or its characters are missing. */
 inline std::string toString(const CMPIString* string) {
     return cim::charactersOf(string).value_or(std::string());
 }
@@ -30,18 +30,18 @@ inline bool isAbsent(const CMPIStatus& status) {
     return status.rc == CMPI_RC_ERR_NOT_FOUND || status.rc == CMPI_RC_ERR_NO_SUCH_PROPERTY;
 }
 
-/** The message that the object manager could not do a task, with its status and its reason if it returned one. */
+/** The message that the object manager could not do a task, with the error code and reason that it returned. */
 std::string managerFailure(const char* task, const CMPIStatus& status);
 
-/** Fails with managerFailure() if the object manager could not do its task. */
+/** Fails with managerFailure() if the object manager could not do a task. */
 void require(bool isDone, const char* task, const CMPIStatus& status = {CMPI_RC_OK, nullptr});
 
-/** The same for a task with a status. */
+/** Fails with managerFailure() unless the status of a task is OK. */
 inline void requireOk(const char* task, const CMPIStatus& status) {
     require(status.rc == CMPI_RC_OK, task, status);
 }
 
-/** The result of a call that has to succeed. */
+/** Calls a function of an object and returns its result. Fails with managerFailure() unless its status is OK. */
 template <auto function, class Object, class... Arguments>
 auto demand(const char* task, Object* object, Arguments... arguments) {
     const auto answer = ask<function>(object, arguments...);
@@ -49,7 +49,7 @@ auto demand(const char* task, Object* object, Arguments... arguments) {
     return answer.value;
 }
 
-/** @name Parts, creation and extension of objects, which fail if the object manager does */
+/** @name Reading, creating and extending objects; these functions fail if the object manager fails */
 ///@{
 std::string classNameOf(const CMPIObjectPath* path);
 std::string nameSpaceOf(const CMPIObjectPath* path);
@@ -71,15 +71,15 @@ inline void setProperty(const CMPIInstance* instance, const char* name, const CM
 }
 ///@}
 
-// The gate compares and checks values as C++ strings, whatever their CIM type: the characters of a string or datetime,
-// the decimal digits of an integer, "true" or "false" of a boolean. The schema has the type.
+// The gate compares and checks values of all CIM types as C++ strings: the characters of a string or datetime, the
+// decimal digits of an integer, "true" or "false" for a boolean. The schema has the type.
 
-/** Values of properties, each property once. */
+/** Properties and their values. Each property occurs at most once. */
 using Values = std::vector<std::pair<const Property*, std::string>>;
 
 /**
- * Reads a property of an instance. None if it is absent or null. Fails with CMPI_RC_ERR_TYPE_MISMATCH if the value has
- * another type or is too large, and if the object manager cannot read it.
+ * Returns the value of a property; none if it is absent or null. Fails with CMPI_RC_ERR_TYPE_MISMATCH if the value has
+ * another type or is out of range, and with managerFailure() if the object manager cannot read it.
  */
 std::optional<std::string> propertyOf(const CMPIInstance* instance, const Property& property);
 
@@ -95,19 +95,19 @@ Values valuesOf(const CMPIInstance* instance, const Class& requested, IsWanted i
     return values;
 }
 
-/** Reads a key that is not a reference. None also if it has another type or the object manager cannot read it. */
+/** The value of a key that is not a reference; none if the key is missing, has another type or cannot be read. */
 std::optional<std::string> keyOf(const CMPIObjectPath* path, const char* key, CMPIType type);
 
-/** The object that a key refers to; null if there is none. */
+/** The path of the object that a key refers to; null if there is none. */
 CMPIObjectPath* referenceOf(const CMPIObjectPath* path, const char* key);
 
-/** Whether two paths have keys and name the same instance. Namespaces are compared where both paths have one. */
+/** Whether two paths have keys and name the same instance. Compares namespaces only if both paths have one. */
 bool samePath(const CMPIObjectPath* left, const CMPIObjectPath* right);
 
 /**
- * An object path or an instance that the gate makes for the provider, without the object manager. Reading it cannot
- * fail: if the provider cannot read a key, it uses its first instance. It has only the functions that the provider
- * calls.
+ * An object path or an instance that the gate creates for the provider, without the object manager, so that reading it
+ * cannot fail: a provider that cannot read a key would use its first instance instead. Has only the functions that the
+ * provider calls.
  */
 class LocalObject {
 public:
@@ -149,8 +149,8 @@ private:
 };
 
 /**
- * The path as the provider expects it: the class's name as in the MOF, its keys and no others. Fails with
- * CMPI_RC_ERR_INVALID_PARAMETER if a key is missing, since such a path names no instance.
+ * The path as the provider expects it: the class name spelled as in the MOF, and only the keys of the class. Fails with
+ * CMPI_RC_ERR_INVALID_PARAMETER if a key is missing or has another type, since such a path names no instance.
  */
 LocalObject localPath(const CMPIObjectPath* path, const Class& named);
 

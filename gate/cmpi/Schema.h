@@ -17,7 +17,7 @@ struct Property {
     CMPIType type;
     bool isKey;
     bool isWritable;
-    const char* referenceClass;  ///< of a reference; null otherwise
+    const char* referenceClass;  ///< the class that a reference refers to; null for a property
 };
 
 /** A class as the MOF declares it. */
@@ -37,13 +37,13 @@ struct Classes {
     const Class* end() const;
 };
 
-/** The class of computers. Another provider serves it; each association has a computer at one end. */
+/** The class of computers, which another provider serves. Each association has a computer at one end. */
 constexpr const char* computerClass = "VELKO_ComputerSystem";
 
-/** The class of the agent, its only instance. */
+/** The class whose only instance is the agent. */
 constexpr const char* agentClass = "VELKO_OstrelAgent";
 
-/** The class of that name; null for one that the MOF does not declare. */
+/** The class with this name; null if the MOF declares none. */
 inline const Class* findClass(std::string_view name) {
     const Classes classes{};
     return cim::findNamed(classes, name);

@@ -7,7 +7,7 @@ namespace gate {
 
 namespace {
 
-/** Releases a lock while it exists. Copies its functions, since the wrapper may be replaced meanwhile. */
+/** Releases a lock during its lifetime. Copies the lock's functions, since the wrapper may be replaced meanwhile. */
 class ScopedRelease {
 public:
     explicit ScopedRelease(const WrappedBroker::Lock& itsLock) : lock(itsLock) { lock.release(); }
@@ -19,7 +19,7 @@ private:
     const WrappedBroker::Lock lock;
 };
 
-/** Calls the manager's function of a slot. */
+/** Calls the function that the object manager's table has in this slot. */
 template <auto slot, class Table, class Result, class... Arguments>
 Result forward(const CMPIBroker* broker, Arguments... arguments) {
     constexpr bool isService = std::is_same_v<Table, CMPIBrokerFT>;

@@ -5,16 +5,16 @@
 namespace gate {
 
 /**
- * The broker that the provider receives. It forwards every call to the object manager's broker, with the manager's own
- * pointer, since managers keep more data behind it than the structure declares. A service of the manager, such as an
- * operation on another class, may lead back to the gate, so the lock is released for it.
+ * The broker that the provider receives. It forwards every call with a pointer to the object manager's own broker, in
+ * which managers keep more data than the structure declares. A service of the manager, such as an operation on another
+ * class, may call the gate again, so the lock is released during services.
  *
- * Functions that the manager lacks are lacking here, too. So are the messages with a variable number of arguments,
- * which cannot be forwarded and which the provider does not use.
+ * It lacks the functions that the manager lacks, and the message functions with a variable number of arguments, which
+ * cannot be forwarded and which the provider does not call.
  */
 class WrappedBroker {
 public:
-    /** The functions of a lock that the caller holds, and that is released during the manager's services. */
+    /** The functions of a lock that the caller holds. The lock is released during the manager's services. */
     struct Lock {
         void (*release)();
         void (*reacquire)();

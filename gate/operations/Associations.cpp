@@ -2,7 +2,7 @@
 
 #include "Operations.h"
 
-// All association requests return the same facts: the object manager knows the computers, and the provider knows which
+// All association requests combine the same facts: the object manager knows the computers, and the provider knows which
 // lease or warranty belongs to each.
 
 namespace gate {
@@ -17,16 +17,16 @@ struct End {
 
 enum class ElementForm { path, instance };
 
-/** A direction of an association, and the ends that its pairs must have: null for any. */
+/** The direction in which an association is followed, and the ends that the pairs must have: null for any. */
 struct Traversal {
     const Class* association;
-    ElementForm form = ElementForm::path;  ///< of the elements, unless one is required
+    ElementForm form = ElementForm::path;  ///< of the elements; always a path if an element is required
     const Property* target = nullptr;      ///< the property that refers to the associated object
     const CMPIObjectPath* computer = nullptr;
     const CMPIObjectPath* element = nullptr;
 };
 
-/** A computer and one of its leases or warranties, which is either a path or an instance. */
+/** A computer and one of its leases or warranties. The element has either a path or an instance. */
 struct AssociationPair {
     Traversal traversal;
     End computer;
@@ -37,7 +37,7 @@ using Ends = std::vector<End>;
 using Traversals = std::vector<Traversal>;
 using Pairs = std::vector<AssociationPair>;
 
-/** Fails unless the computers could be enumerated. Logs the reason, too, since clients often drop it. */
+/** Fails unless the computers could be enumerated. Also logs the reason, since many clients do not show it. */
 void requireEnumerated(bool isDone, const CMPIStatus& status) {
     if (!isDone) {
         const std::string message = managerFailure("enumerate VELKO_ComputerSystem", status);
@@ -65,7 +65,7 @@ bool hasNext(CMPIEnumeration* computers) {
     return answer.value != 0;
 }
 
-/** A copy of the instance's path with the request's namespace, which some managers omit. */
+/** A copy of the instance's path with the request's namespace: some managers return paths without a namespace. */
 const CMPIObjectPath* computerPathOf(const ClientRequest& request, const CMPIInstance* instance) {
     const CMPIObjectPath* given = pathOf(instance);
     require(keyOf(given, "Name", CMPI_string).has_value(), "name a computer");
@@ -80,7 +80,7 @@ const CMPIObjectPath* computerPathOf(const ClientRequest& request, const CMPIIns
     return path;
 }
 
-/** Enumerates the computers in the request's namespace, each once. Releases the lock for it. */
+/** Returns each computer in the request's namespace once. Releases the lock while the manager enumerates them. */
 Ends knownComputers(const ClientRequest& request, ProviderSession& session) {
     Ends computers;
     CMPIEnumeration* enumeration = enumerateComputers(request, session);
@@ -90,7 +90,7 @@ Ends knownComputers(const ClientRequest& request, ProviderSession& session) {
         requireEnumerated(instance != nullptr, next.status);
         const CMPIObjectPath* path = computerPathOf(request, instance);
         if (nameSpaceOf(pathOf(instance)).empty()) {
-            // Makes the instance's path complete, too, if the manager can.
+            // Also adds the namespace to the path in the instance, if the manager supports that.
             tell<&CMPIInstanceFT::setObjectPath>(instance, path);
         }
         const bool isKnown =
@@ -102,7 +102,7 @@ Ends knownComputers(const ClientRequest& request, ProviderSession& session) {
     return computers;
 }
 
-/** Adds the pairs of a computer. The provider knows its leases and warranties. */
+/** Adds the pairs of a computer and the leases or warranties that belong to it according to the provider. */
 void addPairs(Pairs& pairs, const ProviderSession& session, const Traversal& traversal, const End& computer) {
     if (traversal.computer != nullptr && !samePath(computer.path, traversal.computer)) {
         return;
@@ -121,7 +121,7 @@ void addPairs(Pairs& pairs, const ProviderSession& session, const Traversal& tra
     }
 }
 
-/** The pairs of the traversals, in the order of the computers. */
+/** The pairs of each traversal, in the order of the computers. */
 Pairs pairsOf(const ClientRequest& request, ProviderSession& session, const Traversals& traversals) {
     Pairs pairs;
     const Ends computers = knownComputers(request, session);
@@ -141,7 +141,7 @@ bool matches(const char* filter, const char* name) {
     return isAny(filter) || sameName(filter, name);
 }
 
-/** Whether a path's class is the class or, as the object manager knows, a subclass of it. */
+/** Whether a path's class is this class or a subclass of it. Asks the object manager about classes not in the MOF. */
 bool isA(const ClientRequest& request, const CMPIObjectPath* path, const char* className) {
     const CMPIBroker* broker = request.broker();
     const std::string pathsClass = classNameOf(path);
@@ -167,7 +167,7 @@ const CMPIObjectPath*& requiredAt(const Property& end, Traversal& traversal) {
 
 /**
  * The traversals that begin at the request's path, which must have keys. Names ignore letter case; null and the empty
- * string mean any. The role is the property of the association that refers to the path, the result role the other one.
+ * string mean any. The role is the association's property that refers to the path, the result role the other property.
  */
 Traversals traversalsFrom(const ClientRequest& request, const char* associationClass, const char* role,
                           const char* resultRole, ElementForm form = ElementForm::path) {
@@ -191,7 +191,7 @@ Traversals traversalsFrom(const ClientRequest& request, const char* associationC
     return traversals;
 }
 
-/** Returns what `make(request, pair)` makes of each pair of the traversals, in one session. */
+/** Returns the results of `make(request, pair)` for all pairs of the traversals, which one session reads. */
 template <class Results, class Make>
 Results traverse(const ClientRequest& request, const Traversals& traversals, Make make) {
     Results results;
@@ -204,7 +204,7 @@ Results traverse(const ClientRequest& request, const Traversals& traversals, Mak
     return results;
 }
 
-/** Returns the results that are of the result class to the client. */
+/** Returns to the client only those results that are of the result class. */
 template <class Results, class PathOf>
 void returnOfClass(const ClientRequest& request, const char* resultClass, Results results, PathOf pathOfResult) {
     const auto isOther = [&](const auto* result) {
@@ -230,7 +230,7 @@ const CMPIObjectPath* associationPath(const ClientRequest& request, const Associ
     return path;
 }
 
-/** The instance of an association, regardless of a property list: both of its properties are keys. */
+/** An instance of an association. It ignores property lists, because both properties are keys. */
 const CMPIInstance* associationInstance(const ClientRequest& request, const AssociationPair& pair) {
     CMPIInstance* instance = makeInstance(request.broker(), associationPath(request, pair));
     for (const Property& end : *pair.traversal.association) {

@@ -6,8 +6,8 @@ namespace gate {
 namespace {
 
 /**
- * The class's file. Fails with CMPI_RC_ERR_NOT_SUPPORTED if its instances cannot be changed that way.
- * @param hasRecords whether it must be a record file, for creations and deletions
+ * The class's data file. Fails with CMPI_RC_ERR_NOT_SUPPORTED if the class does not support the change.
+ * @param hasRecords whether the file must be a record file, as for creations and deletions
  */
 const DataFile& fileOf(const Class& requested, bool hasRecords, const char* changed) {
     const DataFile* file = dataFileOf(requested);
@@ -35,7 +35,7 @@ void requireKnownProperties(const Class& requested, const CMPIInstance* instance
     }
 }
 
-/** The identifier of a new record: from the path or, if that has none, from the instance. */
+/** The identifier of a new record: from the path or, if the path has none, from the instance. */
 std::string identifierOf(const CMPIObjectPath* path, const CMPIInstance* instance, const Property& key,
                          const Class& requested) {
     std::string fromPath = keyOf(path, key.name, key.type).value_or(std::string());
@@ -58,7 +58,7 @@ void createInstance(const ClientRequest& request, const CMPIInstance* instance) 
     const Values given = valuesOf(instance, requested, [](const Property& property) { return !property.isKey; });
     const std::string nameSpace = nameSpaceOf(request.path);
     CMPIObjectPath* created = makePath(request.broker(), nameSpace, requested.name);
-    // In CMPI, the pointer to a value of type CMPI_chars is the pointer to its characters.
+    // CMPI expects a pointer to the characters for CMPI_chars, instead of a pointer to a CMPIValue.
     addKey(created, key.name, reinterpret_cast<const CMPIValue*>(identifier.c_str()), CMPI_chars);
     const Paths results{created};
     const LocalObject path(nameSpace, requested, {{&key, identifier}});
@@ -87,7 +87,7 @@ void deleteInstance(const ClientRequest& request) {
     const DataFile& file = recordFileOf(requested);
     ProviderSession session(request, ProviderSession::Access::change);
     const LocalObject path = localPath(request.path, requested);
-    session.get(path, requested);  // there must be one
+    session.get(path, requested);  // fails if there is no such record
     Transaction(session, requested, file, path).remove();
 }
 

@@ -34,8 +34,8 @@ const CMPIInstance* PropertySelection::applied(const CMPIBroker* broker, const C
         return instance;
     }
     CMPIInstance* made = makeInstance(broker, pathOf(instance));
-    // Some managers put all properties of the class into a new instance; the filter removes them. The keys are listed,
-    // too, since some managers hide properties that are only named as keys.
+    // Some managers put all properties of the class into a new instance; the filter removes those not selected. It also
+    // lists the keys as properties, since some managers hide properties that are only named as keys.
     std::vector<const char*> keys;
     for (const Property& property : requested) {
         keys.insert(keys.end(), property.isKey ? 1 : 0, property.name);
@@ -59,7 +59,7 @@ const CMPIInstance* PropertySelection::applied(const CMPIBroker* broker, const C
 
 namespace {
 
-// Functions that end the session before their results are returned.
+// These functions end their session before the results are returned to the client.
 
 Instances instancesOf(const ClientRequest& request, const Class& requested, const char** properties) {
     const ProviderSession session(request);

@@ -15,19 +15,19 @@ namespace gate {
 namespace {
 
 /**
- * The time that a shutdown waits for requests that wait for other programs, such as slow clients. They may wait for the
- * thread that ends the object manager or the process.
+ * How long a shutdown waits for requests that wait for other programs, such as slow clients. Such a request may never
+ * end, for example if it waits for the thread that is shutting down.
  */
 constexpr std::chrono::seconds drainTimeout{5};
 
-/** The time that a request waits for another process that uses the data directory, and for up-calls of the provider. */
+/** How long a request waits for another process that uses the data directory, and for up-calls of the provider. */
 constexpr std::chrono::seconds waitTimeout{5};
 constexpr std::chrono::milliseconds pollInterval{10};
 
-/** How long a request waits for newer records if it may use older ones. A file's time has a resolution of 10 ms. */
+/** How long a request waits for newer records if older ones suffice. File times have a resolution of up to 10 ms. */
 constexpr std::chrono::milliseconds newerTimeout{50};
 
-/** Releases the lock while the condition is true, but not much longer than the timeout. Returns the condition. */
+/** Waits with the lock released while a condition holds, at most for the timeout. Returns whether it still holds. */
 template <class Condition>
 bool waitWhile(LockGuard& guard, std::chrono::milliseconds timeout, Condition condition) {
     const auto end = std::chrono::steady_clock::now() + timeout;
@@ -40,23 +40,23 @@ bool waitWhile(LockGuard& guard, std::chrono::milliseconds timeout, Condition co
     return false;
 }
 
-/** Keeps this library and its dependencies in the process, for a request that is still running in them. */
+/** Keeps this library and its dependencies in the process, because a request is still running in them. */
 void stayLoaded() {
     Dl_info self{};
     if (dladdr(&theRequestLock, &self) != 0) {
-        dlopen(self.dli_fname, RTLD_LAZY | RTLD_NOLOAD | RTLD_NODELETE);  // not closed, which would end its effect
+        dlopen(self.dli_fname, RTLD_LAZY | RTLD_NOLOAD | RTLD_NODELETE);  // never closed
     }
 }
 
-/** Shuts down when this library is unloaded and when the process ends. */
+/** Ends the connection when this library is unloaded and when the process ends. */
 class ShutdownAtExit {
 public:
     ~ShutdownAtExit() { abi::__cxa_finalize(this); }
 
-    /** Called after the provider was loaded: then no request is running when its static objects are destroyed. */
+    /** Called after the provider was loaded, so that requests end before its static objects are destroyed. */
     void registerAgain() {
         isRegistering = true;
-        abi::__cxa_finalize(this);  // calls and forgets the earlier registration
+        abi::__cxa_finalize(this);  // calls and removes the function registered before
         isRegistering = false;
         abi::__cxa_atexit(
             [](void* self) {
@@ -103,7 +103,7 @@ void ProviderConnection::connect(const CMPIBroker* manager) {
         if (library.isLoaded()) {
             library.createInterfaces(wrapped->handle());
         } else {
-            load();  // if the files are being written, again at the first request
+            load();  // if the files are being written, the first request tries again
         }
     } catch (...) {
         set(nullptr);
@@ -135,14 +135,14 @@ void ProviderConnection::requireCurrent(LockGuard& guard, bool mayBeOlder) {
 }
 
 /**
- * Loads the provider, which reads its files. Unloads it first if it is loaded and the files are complete. Returns
- * whether the files are complete and did not change during the call.
+ * Unloads the provider, if it is loaded, and loads it, so that it reads its files. Does neither if the files are
+ * incomplete. Returns whether the files are complete and did not change during the call.
  */
 bool ProviderConnection::load() {
     failIf(theDirectory.hasLostFiles(), CMPI_RC_ERR_FAILED,
            "The record files were removed. Restore the data directory and try again.");
     if (!theDirectory.open()) {
-        return false;  // a request may read the older tables
+        return false;  // a request can still read the older tables
     }
     isOutdated = true;
     library.unload();
@@ -164,7 +164,7 @@ void ProviderConnection::requireRead(const Class& requested, std::size_t count) 
     if (table == nullptr || table->isRead) {
         return;
     }
-    if (!table->count) {  // the gate could not read the file, but the provider may have
+    if (!table->count) {  // the gate could not read the file before; the provider may have read it
         table->count = theDirectory.recordCounts()[static_cast<std::size_t>(table - tables.data())];
     }
     if (count != table->count) {

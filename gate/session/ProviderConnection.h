@@ -14,23 +14,23 @@
 namespace gate {
 
 /**
- * The provider's shared library, in the directory of this one. It is not linked: the provider reads its record files
- * when it is loaded, so they must be recovered first. If it is loaded again, it reads them again.
+ * The provider's shared library, in the directory of this one. It is not linked, because the provider reads its record
+ * files each time it is loaded, and the files must be recovered before that.
  */
 class ProviderLibrary {
 public:
     bool isLoaded() const { return handle != nullptr; }
 
     /**
-     * Loads the library. Throws std::runtime_error with the reason, also if another part of the process has loaded it:
-     * the provider would not read its files again.
+     * Loads the library. Throws std::runtime_error with the reason if that fails, or if another part of the process has
+     * loaded the library, since the provider would not read its files again.
      */
     void load();
 
-    /** Unloads the library if it is loaded. It has no interfaces then. */
+    /** Unloads the library if it is loaded. After that, there are no interfaces. */
     void unload();
 
-    /** Calls the factories, while it is loaded. Fails with CMPI_RC_ERR_FAILED unless both return an interface. */
+    /** Calls the factories of the loaded library. Fails with CMPI_RC_ERR_FAILED unless both return an interface. */
     void createInterfaces(const CMPIBroker* broker);
 
     /** The provider's interface that has a function of this type; null if there is none. */
@@ -58,41 +58,41 @@ public:
     constexpr ProviderConnection() = default;
 
     /**
-     * Connects the provider to a broker, which then serves all requests. Opens the request lock if it was
-     * closed. Returns at once if the broker and its tables are those of the last call: managers call factories often,
-     * possibly while they hold a lock, and must not wait for requests.
+     * Connects the provider to a broker, which then serves all requests. Opens the request lock if it was closed.
+     * Returns at once if the broker and its tables are the same as in the last call: managers call factories often,
+     * some with a lock held, and must not wait for requests.
      * @throws ManagerGone if the object manager or the process is shutting down
      */
     void connect(const CMPIBroker* manager);
 
-    /** Unloads the provider when the process ends. */
+    /** Unloads the provider and releases the data directory, unless a request is in an up-call. Called at shutdown. */
     void endProcess();
 
-    /** The object manager's broker; null if there is none. Waits for no request. */
+    /** The object manager's broker; null if there is none. Does not wait for requests. */
     const CMPIBroker* broker() const;
 
-    /** Waits for the requests, ends the provider and forgets the broker. */
+    /** Waits for the running requests, then cleans up and unloads the provider, and forgets the broker. */
     void shutdown(const CMPIContext* context);
 
-    /** @name Callable with the request lock held, while there is a broker */
+    /** @name Functions to call with the request lock held, while there is a broker */
     ///@{
     WrappedBroker& wrappedBroker() { return *wrapped; }
     const ProviderLibrary& provider() const { return library; }
 
     /**
-     * Ensures that this process owns the data directory, for a change. Releases the lock until another owner ends.
-     * Fails with CMPI_RC_ERR_FAILED if that takes too long.
+     * Ensures that this process owns the data directory, for a change. Waits with the lock released until another owner
+     * ends. Fails with CMPI_RC_ERR_FAILED if that takes too long, or if this process cannot be the owner.
      */
     void requireOwner(LockGuard& guard);
 
-    /** Marks the provider's tables as different from its files, so that requireCurrent() loads it again. */
+    /** Marks the provider's tables as different from its files, so that requireCurrent() loads the provider again. */
     void setOutdated() { isOutdated = true; }
 
     /**
-     * Loads the provider if it is not loaded or outdated. Releases the lock until no other request is in an up-call of
-     * the provider, since it cannot be unloaded before, and until no other process writes the files. Fails with
-     * CMPI_RC_ERR_FAILED if that takes too long, or if a file was removed, whose records would be lost.
-     * @param mayBeOlder whether the provider may have older records: then it waits for newer ones only briefly
+     * Loads the provider if it is outdated or not loaded. Before that, waits with the lock released until no request is
+     * in an up-call, since the provider could not be unloaded, and until no other process writes the files. Fails with
+     * CMPI_RC_ERR_FAILED if that takes too long, or if a file was removed, because its records would be lost.
+     * @param mayBeOlder whether older records suffice: then the wait for newer ones is short
      */
     void requireCurrent(LockGuard& guard, bool mayBeOlder);
 
@@ -101,7 +101,7 @@ public:
 
     /**
      * Fails with CMPI_RC_ERR_FAILED unless the provider has as many records of a class as the file had when the
-     * provider was loaded: it does not report that it could not read. Only the first call compares them.
+     * provider was loaded: the provider does not report failed reads. Once they match, later calls do not compare them.
      */
     void requireRead(const Class& requested, std::size_t count);
     ///@}
@@ -113,10 +113,10 @@ private:
 
     ProviderLibrary library{};
     bool isOutdated = false;
-    std::array<Table, durable::recordFileCount> tables{Table{"VELKO_Lease"}, Table{"VELKO_Warranty"}};  ///< by file
+    std::array<Table, durable::recordFileCount> tables{Table{"VELKO_Lease"}, Table{"VELKO_Warranty"}};  ///< per file
     std::size_t upCalls = 0;  ///< requests in the provider that have released the lock
     std::optional<WrappedBroker> wrapped{};
-    mutable std::mutex mutex{};  ///< of the members below, for callers without the request lock
+    mutable std::mutex mutex{};  ///< protects the members below, for callers without the request lock
     const CMPIBroker* managersOwn = nullptr;
     CMPIBroker connectedBroker{};  ///< a copy of the broker, made when the provider was connected
 };

@@ -9,7 +9,7 @@ namespace gate {
 
 namespace {
 
-/** The provider's file: in the directory of the file that contains this function. */
+/** The path of the provider's library, which is in the directory of the library that contains this function. */
 std::string libraryPath() {
     Dl_info self{};
     const bool isKnown = dladdr(reinterpret_cast<const void*>(&libraryPath), &self) != 0 && self.dli_fname != nullptr;

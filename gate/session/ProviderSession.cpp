@@ -7,7 +7,7 @@ namespace {
 constexpr const char** allProperties = nullptr;
 constexpr const char* any = nullptr;
 
-/** Returns results with a function of the request's result. */
+/** Returns the results to the client, each with this function of the request's CMPIResult. */
 template <auto function, class Object>
 void returnAll(const ClientRequest& request, const std::vector<Object>& results) {
     constexpr const char* task = "accept the results";
@@ -28,7 +28,7 @@ const CMPIInstance* firstOf(const Instances& instances) {
     return instances.empty() ? nullptr : instances.front();
 }
 
-/** The provider's response to a request. Its objects belong to the object manager, which frees them after it. */
+/** The provider's response to a request. The object manager owns its objects and frees them after the request. */
 struct ProviderResponse {
     Instances instances{};
     Paths paths{};
@@ -42,7 +42,7 @@ CMPIStatus collect(const CMPIResult* result, Object* object) {
     return {CMPI_RC_OK, nullptr};
 }
 
-/** The functions that the provider calls, of a CMPI result that collects its response to be checked. */
+/** The functions of a CMPIResult that collects the provider's response, except those that the provider never calls. */
 CMPIResultFT collectorFunctions{
     CMPIVersion200,
     nullptr,
@@ -74,7 +74,7 @@ ProviderResponse call(const ClientRequest& request, const LocalObject& path, Arg
     return response;
 }
 
-/** The same for a function that ends its response and omits objects that the provider cannot create. */
+/** The same, but fails if the provider did not end its response, or omitted an object that could not be created. */
 template <auto function, class... Arguments>
 ProviderResponse read(const ClientRequest& request, const LocalObject& path, Arguments... arguments) {
     ProviderResponse response = call<function>(request, path, arguments...);
@@ -109,7 +109,7 @@ void ClientRequest::returnResults(const Paths& paths) const {
 
 ProviderSession::ProviderSession(const ClientRequest& itsRequest, Access access)
     : request(itsRequest), isReading(access == Access::read) {
-    request.broker();  // there must be one
+    request.broker();  // throws if there is none
     if (!isReading) {
         theConnection.requireOwner(guard);
     }
@@ -155,7 +155,7 @@ Instances ProviderSession::associators(const LocalObject& computer, const Class&
 
 const CMPIInstance* ProviderSession::find(const LocalObject& keys, const Class& requested) const {
     if (sameName(requested.name, agentClass)) {
-        // A get does not end its response for other keys than the only instance's, as after an error.
+        // For the keys of another instance, the provider does not end its response to a get, as after an error.
         const CMPIInstance* agent = firstOf(instances(requested));
         return agent != nullptr && samePath(pathOf(agent), keys.path()) ? agent : nullptr;
     }

@@ -20,36 +20,36 @@ struct ClientRequest {
 
     bool hasManager() const { return theRequestLock.generation() == generation; }
 
-    /** Throws ManagerGone if the object manager has ended. Called before each of its functions. */
+    /** Throws ManagerGone if the object manager has ended. Then none of its functions must be called. */
     void requireManager() const { ManagerGone::throwUnless(hasManager()); }
 
     /** The broker that the latest factory call received. Throws ManagerGone if there is none. */
     const CMPIBroker* broker() const;
 
-    /** The same, but null if there is none. */
+    /** The same broker, but null if there is none. */
     const CMPIBroker* brokerOrNull() const { return hasManager() ? theConnection.broker() : nullptr; }
 
     /** The path's class. Fails with CMPI_RC_ERR_INVALID_CLASS if the provider does not serve it. */
     const Class& requestedClass() const;
 
     /**
-     * Returns the results to the client and ends. Called when all of them exist, so that a request that fails returns
-     * none. Fails if the object manager does not accept one.
+     * Returns the results to the client and ends the response. Call it when all results exist, so that a request that
+     * fails returns none. Fails if the object manager does not accept a result.
      */
     void returnResults(const Instances& instances) const;
     void returnResults(const Paths& paths) const;
 };
 
 /**
- * A request's access to the provider, through the provider's own function tables. Each function except releaseFor() is
- * one request of the provider. Holds the request lock, so no other request runs in the provider, except while the
- * provider or releaseFor() waits for the object manager. Throws ManagerGone if that ends.
+ * A request's access to the provider, through the provider's own function tables. Each function except releaseFor()
+ * sends a request to the provider. Holds the request lock, so that no other request runs in the provider, except while
+ * the provider or releaseFor() waits for the object manager. Throws ManagerGone if the object manager ends.
  *
- * An object manager may crash while a client's object is read: SFCB does for a string that was sent as an integer.
- * Begin the session before you read a client's keys and values: then no data file is being written.
+ * An object manager may crash while a client's object is read: SFCB does if the client sent a string for an integer.
+ * Begin the session before you read a client's keys and values, so that no data file is being written.
  *
- * The provider logs its errors and returns success. A response that was not ended, or has another number of records
- * than the file, is a Failure here; the caller has to check the result of a change.
+ * The provider logs its errors and returns success. The session throws Failure if a response was not ended, or if the
+ * provider has not read all records of the file. The caller has to check the result of a change.
  */
 class ProviderSession {
 public:
@@ -62,7 +62,7 @@ public:
     Paths names(const Class& requested) const;
     Instances instances(const Class& requested) const;
 
-    /** The leases or warranties of a computer, whose path has its keys. */
+    /** The leases or warranties of the computer with these keys. */
     Paths associatorNames(const LocalObject& computer, const Class& association) const;
     Instances associators(const LocalObject& computer, const Class& association) const;
 
@@ -72,7 +72,7 @@ public:
     /** The instance with the keys. Fails with CMPI_RC_ERR_NOT_FOUND if there is none. */
     const CMPIInstance* get(const LocalObject& keys, const Class& requested) const;
 
-    /** Returns the new instance, which has default values. Fails if there is an instance with the keys. */
+    /** Creates an instance with default values and returns it. Fails if there is an instance with the keys. */
     const CMPIInstance* create(const LocalObject& keys);
     void modify(const LocalObject& keys, const LocalObject& values);
     void remove(const LocalObject& keys);

@@ -8,10 +8,10 @@ namespace gate {
 
 namespace {
 
-/** The requests of this thread, for which close() must not wait. */
+/** The number of requests of this thread. A close() on this thread must not wait for them. */
 thread_local std::size_t requestsHere = 0;
 
-/** Whether this thread holds the lock, which close() then has to leave to it. */
+/** Whether this thread holds the lock. If so, a close() on this thread does not wait for it or release it. */
 thread_local bool isHeldHere = false;
 
 }  // namespace
@@ -24,7 +24,7 @@ struct RequestLock::Waiter {
     Waiter* next = nullptr;
 };
 
-/** The link of a list that points to a waiter, or the null link at its end. */
+/** The link that points to a waiter in a list; for null, the null link at the end of the list. */
 RequestLock::Waiter*& RequestLock::linkTo(const Waiter* waiter, Waiter*& list) {
     Waiter** link = &list;
     while (*link != waiter) {
@@ -61,7 +61,7 @@ bool RequestLock::reacquire(std::optional<std::size_t> itsGeneration) noexcept {
     return waitForLock(lock, itsGeneration);
 }
 
-/** Waits for the lock; with a generation, not beyond its end. Returns whether this thread holds the lock. */
+/** Waits for the lock; with a generation, at most until it ends. Returns whether this thread holds the lock. */
 bool RequestLock::waitForLock(std::unique_lock<std::mutex>& lock, std::optional<std::size_t> itsGeneration) {
     Waiter self;
     linkTo(nullptr, waiters) = &self;
@@ -85,7 +85,7 @@ void RequestLock::release() noexcept {
     notify();
 }
 
-/** Wakes the threads that may continue: the longest waiter, which a newcomer cannot overtake, and those in close(). */
+/** Wakes the threads in close() and the longest waiter. Newcomers cannot overtake that waiter. */
 void RequestLock::notify() {
     if (waiters != nullptr) {
         waiters->wakeUp.notify_one();
@@ -93,7 +93,7 @@ void RequestLock::notify() {
     notifyAll(closers);
 }
 
-/** Called with the mutex locked, so that the waiters still exist. */
+/** Wakes all threads of a list. Call it with the mutex locked, so that the waiters still exist. */
 void RequestLock::notifyAll(Waiter* list) {
     for (Waiter* waiter = list; waiter != nullptr; waiter = waiter->next) {
         waiter->wakeUp.notify_one();
@@ -103,7 +103,7 @@ void RequestLock::notifyAll(Waiter* list) {
 bool RequestLock::close(std::chrono::milliseconds timeout, Closing closing,
                         const std::function<void()>& atEnd) noexcept {
     if (process != 0 && process != durable::currentProcess()) {
-        return false;  // the threads that hold the lock and the mutex are not in this process
+        return false;  // threads that hold the lock or the mutex exist only in the parent process
     }
     const CancellationDisabled cancellationDisabled;
     std::unique_lock<std::mutex> lock(mutex);
@@ -122,7 +122,7 @@ bool RequestLock::close(std::chrono::milliseconds timeout, Closing closing,
     if (isClosedByOther()) {
         return false;
     }
-    const bool wasHeld = std::exchange(isHeld, true);  // no other closer and no returning request acquires it
+    const bool wasHeld = std::exchange(isHeld, true);  // so that no other close() and no reacquire() continues
     lock.unlock();
     atEnd();
     lock.lock();

@@ -16,15 +16,15 @@
 namespace gate {
 
 /**
- * Admits one thread to the provider, in order of arrival, and waits for requests at shutdown.
+ * Admits threads to the provider one by one, in order of arrival, and waits for running requests at shutdown.
  *
  * A request begins, may acquire and release the lock several times, and ends. The lock belongs to no thread: while a
  * request has released it to wait for the object manager, another request on the same thread may acquire it.
  *
- * A lock that is closing admits no new request, and serves those that hold it, wait for it or reacquire it. Once it is
- * closed, no thread holds it; a request that reacquires it fails, or waits until it is opened again.
+ * While the lock is closing, it refuses new requests and serves those that hold it, wait for it or reacquire it. Once
+ * closed, only the closing thread can still hold it; reacquire() fails, or waits until the lock is opened again.
  *
- * It is never destroyed, so that a late request can use it. Therefore each waiting thread has its own condition
+ * The lock is never destroyed, so that a late request can use it. Therefore each waiting thread has its own condition
  * variable on its stack.
  */
 class RequestLock {
@@ -33,17 +33,17 @@ public:
 
     constexpr RequestLock() = default;
 
-    /** Whether the request is admitted. If so, it has to call endRequest(). */
+    /** Returns whether the request is admitted. If so, the caller has to call endRequest(). */
     bool beginRequest() noexcept;
     void endRequest() noexcept;
 
-    /** Waits for the lock, behind all earlier callers. Returns false without it if the lock is closing. */
+    /** Waits for the lock, behind all earlier callers. Returns false without the lock if it is closing or closed. */
     bool acquire() noexcept;
     /** Passes the lock to the longest waiter. */
     void release() noexcept;
     /**
      * Acquires the lock after an intermediate release(). If the lock is closed, waits until it is opened; with a
-     * generation, returns false without the lock if it has been closed since then.
+     * generation, returns false without the lock if that generation has ended.
      */
     bool reacquire(std::optional<std::size_t> itsGeneration = std::nullopt) noexcept;
 
@@ -51,9 +51,9 @@ public:
     std::size_t generation() const noexcept { return timesClosed; }
 
     /**
-     * Closes the lock when no other thread holds it or waits for it. Waits for the requests of other threads to end,
-     * but no longer than the timeout, since they may wait for a thread that never answers.
-     * Does nothing in a child process: the requests are in its parent.
+     * Waits for the requests of other threads to end, but no longer than the timeout, since a request may never end.
+     * Then waits until no other thread holds the lock or waits for it, and closes it. Does nothing in a forked child,
+     * since the requests are in its parent.
      * @param atEnd called just before the lock is closed, while no other thread holds it; must not throw
      * @return whether this call has closed the lock
      */
@@ -61,7 +61,7 @@ public:
         std::chrono::milliseconds timeout, Closing closing = Closing::temporary,
         const std::function<void()>& atEnd = [] {}) noexcept;
 
-    /** Opens a closed lock. @return whether it is open now: it is not while closing, or if closed permanently */
+    /** Opens a closed lock. @return whether it is open: false while it is closing, or if it is closed permanently */
     bool open() noexcept;
 
     /** Whether requests of other threads are running. */
@@ -88,15 +88,15 @@ private:
     bool isPermanent = false;
     bool isHeld = false;
     std::size_t requests = 0;
-    std::atomic<pid_t> process{0};  ///< of the latest request
-    Waiter* waiters = nullptr;      ///< the threads that wait for the lock, in order
+    std::atomic<pid_t> process{0};  ///< the process of the latest request
+    Waiter* waiters = nullptr;      ///< the threads that wait for the lock, in order of arrival
     Waiter* closers = nullptr;      ///< the threads that wait in close()
 };
 
-/** The lock of the provider, of which a process has one. */
+/** The only request lock of the process, since a process has one provider. */
 extern RequestLock theRequestLock;
 
-/** Counts a request as active, from before its first call of the broker until after its last one. */
+/** Counts a request as active, from before its first call to the broker until after its last one. */
 class ActiveRequest {
 public:
     ActiveRequest() noexcept : isAdmitted(theRequestLock.beginRequest()) {}
@@ -111,7 +111,7 @@ public:
     const bool isAdmitted;
 };
 
-/** Disables the cancellation of the calling thread, which would end the process or leave a file incomplete. */
+/** Disables cancellation of the calling thread: cancelling it would end the process or leave a file incomplete. */
 class CancellationDisabled {
 public:
     CancellationDisabled() noexcept { pthread_setcancelstate(PTHREAD_CANCEL_DISABLE, &before); }
@@ -123,7 +123,7 @@ private:
     int before = 0;
 };
 
-/** Holds the lock. The constructor throws ManagerGone if the lock is closing. */
+/** Holds the request lock. The constructor throws ManagerGone if the lock is closing or closed. */
 class LockGuard {
 public:
     LockGuard() : isHeld(theRequestLock.acquire()) { ManagerGone::throwUnless(isHeld); }
@@ -134,8 +134,8 @@ public:
     }
 
     /**
-     * Releases the lock for some work. Throws ManagerGone if it was closed meanwhile. After this and other exceptions,
-     * the lock stays released.
+     * Releases the lock during a call to `work()`. Throws ManagerGone if the lock was closed meanwhile. After this and
+     * other exceptions, the lock stays released.
      */
     template <class Work>
     void releaseFor(Work work) {

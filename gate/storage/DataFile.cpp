@@ -30,7 +30,7 @@ void failToStoreIf(bool isFailure, const std::string& path, const char* reason) 
     failIf(isFailure, CMPI_RC_ERR_FAILED, "The change cannot be stored in ", path, ": ", reason, ".");
 }
 
-/** Fails if the file exists and cannot be written or is not a regular file. */
+/** Fails if the file exists, but cannot be opened for writing or is not a regular file. */
 void requireWritableFile(const std::string& path) {
     const int descriptor = open(path.c_str(), O_RDWR | O_CLOEXEC | O_NONBLOCK);
     if (descriptor < 0 && errno == ENOENT) {
@@ -45,7 +45,7 @@ void requireWritableFile(const std::string& path) {
     failToStoreIf(!isRegular, path, "it is not a regular file");
 }
 
-/** Whether the file system has room for the file's growth and for a block that is partly used. */
+/** Whether the file system has room for the file's growth and for one more block, which may be used only partly. */
 bool hasRoom(const std::string& directory, std::size_t growth) {
     constexpr std::size_t block = 4096;
     std::error_code error;
@@ -55,7 +55,7 @@ bool hasRoom(const std::string& directory, std::size_t growth) {
     return growth == 0 || !isKnown || room > growth + block;
 }
 
-/** Whether a line of a record file is the identifier, and the provider does not split it. */
+/** Whether a line of a record file is the identifier, and the provider does not split the identifier at white space. */
 bool hasRecord(const std::string& content, std::string identifier) {
     std::replace(identifier.begin(), identifier.end(), ' ', '_');
     return identifier.find_first_of("\t\n\v\f\r") == std::string::npos &&
@@ -73,7 +73,7 @@ void DataFile::requireWritable(std::size_t growth) const {
     const std::string directory = KO::PlatformUtilities::getKelsaDataDir();
     const std::string subject = path + ": " + "the data directory " + directory;
     requireWritableFile(path);
-    // A rollback and the change of a property file replace the file.
+    // A rollback replaces the file, as does the change of a property file: both create a file in the directory.
     if (access(directory.c_str(), W_OK | X_OK) != 0) {
         throw std::system_error(errno, std::generic_category(), subject);
     }
@@ -119,7 +119,7 @@ void DataFile::rollBack(const std::string& before) const {
     if (hasRecords) {
         records().restore(before);
     } else if (state().content != before) {
-        const std::string path = std::filesystem::canonical(pathOf(*this));  // replaces the target of a link
+        const std::string path = std::filesystem::canonical(pathOf(*this));  // if it is a link, replaces its target
         durable::replaceFile(path, before, path);
         durable::syncDirectoryOf(path);
     }

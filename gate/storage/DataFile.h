@@ -9,17 +9,17 @@
 
 namespace gate {
 
-/** The content of a data file and the time of its last change, which are compared. */
+/** The content and modification time of a data file, to detect whether it was written. */
 struct FileState {
     std::string content;  ///< empty if the file does not exist
     std::filesystem::file_time_type modified{};
 };
 
 /**
- * A class's data file. The provider writes it and does not report errors, so the gate checks it around each change, and
- * keeps a copy of a record file that is always complete (durable/RecordFile.h).
+ * A class's data file. The provider writes the file without reporting errors, so the gate checks it before and after
+ * each change. Of a record file, the gate also keeps complete copies (durable/RecordFile.h).
  *
- * Functions fail with CMPI_RC_ERR_FAILED, the file and the reason, or throw std::system_error with these.
+ * If a function fails, it throws Failure with CMPI_RC_ERR_FAILED or std::system_error, with the file and the reason.
  */
 struct DataFile {
     const char* name;  ///< of the class
@@ -27,9 +27,9 @@ struct DataFile {
     bool hasRecords;  ///< false for a property file, whose instances are neither created nor deleted
 
     /**
-     * Fails if the file cannot be written now. The provider truncates a record file before it notices that the disk is
-     * full.
-     * @param growth the most bytes that the change adds
+     * Fails if the file cannot be written now. Call it before a change, because the provider truncates a record file
+     * even if the disk is full.
+     * @param growth an estimate of the bytes that the change adds
      */
     void requireWritable(std::size_t growth) const;
 
@@ -37,16 +37,16 @@ struct DataFile {
 
     durable::RecordFile records() const;
 
-    /** Whether a record may have the identifier: the record file is incomplete or contains the identifier. */
+    /** Whether a record may have the identifier: the file is incomplete or has the identifier anywhere. */
     bool mayHave(const std::string& content, std::string identifier) const;
 
-    /** @name Storing a change: begin(), the provider's writing, then commit() or rollBack() */
+    /** @name Storing a change: begin(), then the provider writes, then commit() or rollBack() */
     ///@{
-    /** Makes the content restorable. Returns what rollBack() needs; empty for a damaged record file without a copy. */
+    /** Makes the content restorable. Returns the argument of rollBack(): empty for a damaged file without a copy. */
     std::string begin(const std::string& content) const;
 
     /**
-     * Syncs the file and the saved copy. Fails if the file is incomplete, or must differ from a state but does not.
+     * Syncs a record file and a saved copy. Fails if the file is incomplete, or must differ from `before` but does not.
      * @param identifier of a record that the file must have; null for none
      */
     void commit(const FileState& before, bool mustDiffer, const std::string* identifier = nullptr) const;

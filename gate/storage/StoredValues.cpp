@@ -12,7 +12,7 @@ namespace gate {
 
 namespace {
 
-/** Whether the provider copies the value from the preceding property where none is sent. */
+/** Whether the property is part of a personalized pair. The provider copies a missing value from the preceding pair. */
 bool isPersonalized(const Property& property) {
     constexpr std::string_view prefix = "Personalized";
     return sameName(std::string_view(property.name).substr(0, prefix.size()), prefix);
@@ -26,18 +26,18 @@ bool isAmong(const Property& property, const Values& values) {
     return std::any_of(values.begin(), values.end(), [&](const auto& value) { return value.first == &property; });
 }
 
-/** The value in the data file. The provider returns "Null" for a personalized value that is empty there. */
+/** The value in the data file. The provider returns "Null" for a personalized value that is empty in the file. */
 std::string storedValue(const Property& property, const std::string& returned) {
     return isPersonalized(property) && returned == "Null" ? std::string() : returned;
 }
 
-/** The datetime with the offset "-000", if it is zero: "+000" is equal. */
+/** The datetime with the offset "-000" instead of "+000", which is equal. */
 std::string normalized(std::string dateTime) {
     const std::size_t plus = dateTime.find("+000");
     return plus == std::string::npos ? dateTime : dateTime.replace(plus, 1, "-");
 }
 
-/** The value as object managers pass it on: without blanks, and under some without non-ASCII letters, at its ends. */
+/** The value without blanks at its ends, which object managers trim. Some also trim non-ASCII letters there. */
 std::string_view trimmed(std::string_view value, bool alsoNonAscii) {
     const auto stays = [&](unsigned char each) { return each > ' ' && !(alsoNonAscii && each > 0x7F); };
     const auto* begin = std::find_if(value.begin(), value.end(), stays);
@@ -46,8 +46,8 @@ std::string_view trimmed(std::string_view value, bool alsoNonAscii) {
 }
 
 /**
- * Whether a given value is the current one, as the client has read it and the object manager has passed it on. In
- * a writable property of the property list, a different non-ASCII letter at an end is a change.
+ * Whether a given value is the current one, apart from what the object manager has trimmed. For a writable property on
+ * the property list, a missing non-ASCII letter at an end is a change.
  */
 bool isCurrent(const Property& property, const CMPIInstance* current, const std::string& given, bool isListed) {
     const auto value = propertyOf(current, property);
@@ -65,7 +65,7 @@ bool isCurrent(const Property& property, const CMPIInstance* current, const std:
            (trimmed(*value, false) == given || (mayLackLetters && trimmed(*value, true) == given));
 }
 
-/** The reason why a record file or an object manager loses a string; null if they keep it. */
+/** The reason why a record file or an object manager does not preserve a string; null if both preserve it. */
 const char* lossOfString(std::string_view value, bool isIdentifier) {
     const auto has = [&](const char* characters) { return value.find_first_of(characters) != std::string_view::npos; };
     const bool hasOuterBlank = !value.empty() && (value.front() == ' ' || value.back() == ' ');
@@ -81,7 +81,7 @@ const char* lossOfString(std::string_view value, bool isIdentifier) {
     return std::find_if(std::begin(losses), std::end(losses), [](const auto& loss) { return loss.first; })->second;
 }
 
-/** Whether the provider returns a datetime that was stored. It returns null for one that is not valid. */
+/** Whether the provider returns a datetime after it was stored. If not, it returns null. */
 bool isRepresentable(const DataFile& file, const std::string& dateTime) {
     return cim::isPointInTime(dateTime) || (file.hasRecords && cim::isInterval(dateTime));
 }
@@ -95,11 +95,11 @@ const char* lossOf(const DataFile& file, const Property& property, const std::st
 }
 
 bool refusesLossyValues() {
-    // Older agents have no such setting, which means true.
+    // Older agents lack this function and the setting, whose default is true.
     return &KO::Settings::getFlag == nullptr || KO::Settings::getFlag("gate.refuse_lossy_values", true);
 }
 
-/** Whether the changes remove a value. Two properties may have the same value. */
+/** Whether the changes remove a value. Two properties may share one value in the file. */
 bool isRemoved(const std::string& value, const DataFile& file, const CMPIInstance* before, const Values& changes) {
     return std::any_of(changes.begin(), changes.end(), [&](const auto& change) {
         const bool isNullDate = isDate(*change.first) && !isRepresentable(file, change.second);
@@ -174,7 +174,7 @@ void requireChanged(const Class& requested, const DataFile& file, const CMPIInst
         const auto now = propertyOf(after, *property);
         const bool isEqual = now && (isDate(*property) ? normalized(*now) == normalized(value) : *now == value);
         const bool isNull = !now && isDate(*property) && !isRepresentable(file, value);
-        // The provider may return a word for an empty value: it suffices that it is not the former value.
+        // For an empty value, the provider may return "Null". It suffices that the value is not the former one.
         const bool isEmptied = value.empty() && now != propertyOf(before, *property);
         failIf(!isEqual && !isNull && !isEmptied, CMPI_RC_ERR_FAILED, property->name,
                " could not be stored; see the agent's log at level 3000.");

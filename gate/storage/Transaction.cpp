@@ -8,7 +8,7 @@ namespace gate {
 
 namespace {
 
-/** The most bytes that values take in a file. */
+/** An estimate of the bytes that values take in a file. */
 std::size_t sizeOf(const Values& values) {
     std::size_t size = 0;
     for (const auto& value : values) {
@@ -17,7 +17,7 @@ std::size_t sizeOf(const Values& values) {
     return size;
 }
 
-/** Calls a function, and reports the errors of files to the client. */
+/** Calls a function, and converts std::system_error to a Failure for the client. */
 template <class Work>
 auto onFiles(Work work) {
     try {
@@ -39,8 +39,8 @@ FileState Transaction::open(std::size_t growth) const {
 }
 
 /**
- * Calls `change()`, which makes a change, checks it and commits it. If it fails, rolls the change back and passes
- * the failure on, with a note if the file could not be restored.
+ * Calls `change()`, which makes a change, checks it and commits it. If that fails, rolls the change back and fails with
+ * the same reason, plus a note if the file could not be restored.
  */
 template <class Change>
 void Transaction::run(const FileState& before, Change change) const {
@@ -59,7 +59,7 @@ void Transaction::run(const FileState& before, Change change) const {
     }
 }
 
-/** Restores the file and lets the provider read it again. Returns a note for the client if the file is not restored. */
+/** Restores the file and marks the provider as outdated. Returns a note for the client if the file is not restored. */
 std::string Transaction::rollBack(const std::string& restorable) const {
     try {
         if (file.hasRecords && !restorable.empty()) {
@@ -110,13 +110,13 @@ void Transaction::remove() {
     });
 }
 
-/** Makes the changes. Fails unless the provider has them. */
+/** Sends the changes to the provider. Fails unless the instance, read again, has them. */
 void Transaction::apply(const CMPIInstance* current, const Values& changes) const {
     session.modify(path, LocalObject({}, requested, valuesToSend(requested, current, changes)));
     requireChanged(requested, file, current, session.get(path, requested), changes);
 }
 
-/** Fails if the provider and its file have different numbers of records: the next write could lose some. */
+/** Fails if the provider and its file have different numbers of records, since the next write could lose some. */
 void Transaction::requireTable() const {
     if (!file.hasRecords || (theConnection.tableOf(requested)->isVerified && file.records().isStored())) {
         return;
@@ -135,7 +135,7 @@ void Transaction::requireTable() const {
     theConnection.tableOf(requested)->isVerified = true;
 }
 
-/** Makes the provider write a record file that was removed: sets a property of a record to its current value. */
+/** Restores a removed record file from memory: sets a property to its current value, so that the provider writes it. */
 void Transaction::storeTable(const CMPIObjectPath* record) const {
     const LocalObject changed = localPath(record, requested);
     const auto* number = std::find_if(requested.begin(), requested.end(), [](const Property& property) {
@@ -146,7 +146,7 @@ void Transaction::storeTable(const CMPIObjectPath* record) const {
     file.commit({}, true);
 }
 
-/** Refuses other read-only values than an existing record has, since all records have the same. */
+/** Refuses read-only values that differ from those of an existing record, since all records have the same ones. */
 void Transaction::requireReadOnlyValues(const Values& given) const {
     const bool haveReadOnly =
         std::any_of(given.begin(), given.end(), [](const auto& value) { return !value.first->isWritable; });

@@ -10,11 +10,11 @@
 namespace gate {
 
 /**
- * A change of one instance, which is stored completely or rolled back. The provider reports success in either case, so
- * the change is committed only after checks of the instance and of the data file.
+ * A change of one instance, which is stored completely or rolled back. The provider also reports success if it fails,
+ * so the change is committed only after checks of the instance and of the data file.
  *
- * A rollback restores the data file, and the provider is loaded again to read it: it has no operation that restores a
- * deleted record in its place.
+ * A rollback restores the data file, and the provider is loaded again to read it, because the provider has no operation
+ * that restores a deleted record at its position in the file.
  *
  * All functions fail with CMPI_RC_ERR_FAILED if the change cannot be stored.
  */
@@ -24,7 +24,7 @@ public:
         : session(itsSession), requested(itsClass), file(itsFile), path(itsPath) {}
 
     /**
-     * Creates a record with these values. Fails with CMPI_RC_ERR_ALREADY_EXISTS if there is one with the identifier.
+     * Creates a record with these values. Fails with CMPI_RC_ERR_ALREADY_EXISTS if a record has the identifier.
      * @param returnPath returns the record's path to the client; if it throws, the creation is rolled back
      */
     void create(const std::string& identifier, const Values& given, const std::function<void()>& returnPath);
