@@ -106,7 +106,7 @@ void measureInTurn(benchmark::State& state, int turns, const char* firstName, co
     state.counters[secondName] = median(std::move(secondTimes));
 }
 
-/** The number of requests per side and iteration. There may be only one iteration. */
+/** The number of requests per side and iteration, so that even one iteration has a median. */
 int turnsFor(const Case& one) {
     return one.size < largestSize ? 10 : 3;
 }

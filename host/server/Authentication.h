@@ -17,7 +17,7 @@ struct Credentials {
 /** The credentials in the value of a header Authorization. None unless the scheme is Basic and the value is valid. */
 std::optional<Credentials> credentialsFrom(const std::string& authorization);
 
-/** Checks the passwords of users. Called by one thread at a time, since some PAM modules require that. */
+/** Checks the passwords of users. Never called concurrently, since some PAM modules are not thread-safe. */
 class Authenticator {
 public:
     virtual ~Authenticator() = default;

@@ -19,7 +19,7 @@ std::string dateRoundTrip(const std::string& text) {
 
 }  // namespace
 
-TEST(DateTime, IsNoDateAtFirst) {
+TEST(DateTime, IsInitiallyNoDate) {
     EXPECT_EQ(Utils::convertCIMDateTime(DateTime()), noDate);
 }
 

@@ -118,7 +118,7 @@ TEST(File, MayHaveANameThatIsNotUtf8) {
     EXPECT_TRUE(std::filesystem::exists(directory.file("caf\xE9")));
 }
 
-TEST(FilePath, KeepsItsValueInEveryCopy) {
+TEST(FilePath, IsTheSameInEveryCopy) {
     const File::Path path(L"/some/file");
     const File::Path copy = path;
     File::Path assigned(L"");

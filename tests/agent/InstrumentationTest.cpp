@@ -27,7 +27,7 @@ std::vector<std::string> pathsOf(NodeType type) {
 
 }  // namespace
 
-TEST(Instrumentation, HasNoCurrentNodeAtFirst) {
+TEST(Instrumentation, HasInitiallyNoCurrentNode) {
     Instrumentation cursor;
     std::string value = "kept";
     EXPECT_FALSE(static_cast<bool>(cursor));

@@ -14,7 +14,7 @@ std::string nameOf(const Moniker& moniker) {
 
 }  // namespace
 
-TEST(Moniker, IsEmptyWithNothingSelectedAtFirst) {
+TEST(Moniker, IsInitiallyEmptyWithoutASelectedKey) {
     Moniker moniker;
     std::string text = "kept";
     EXPECT_EQ(moniker.getKeyCount(), 0U);

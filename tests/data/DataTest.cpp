@@ -112,7 +112,7 @@ TEST_F(DataTest, TheGateReadsEditedRecordsAfterTheImport) {
     EXPECT_THAT(create("L3"), isAnswered(1));
 }
 
-TEST_F(DataTest, AMissingFileHasNoRecords) {
+TEST_F(DataTest, AMissingFileIsExportedWithoutRecords) {
     EXPECT_EQ(ordered_json::parse(run("export VELKO_Warranty").output).at("records").size(), 0U);
     EXPECT_THAT(run("check"), hasEnded(0, "Warranty.dat does not exist, so there are no records.\n"));
 }
@@ -123,7 +123,7 @@ TEST_F(DataTest, AFileWithoutRecordsNeedsNoLineEnd) {
     EXPECT_THAT(run("check"), hasEnded(0, "Lease.dat is complete (records: 0).\n"));
 }
 
-TEST_F(DataTest, TheReplacedRecordsCanBeRestored) {
+TEST_F(DataTest, RecordsThatAnImportReplacesCanBeRestored) {
     EXPECT_THAT(import(R"({"class": "VELKO_Lease", "records": []})"),
                 hasEnded(0, "Lease.dat was replaced (records: 0).\n"));
     EXPECT_EQ(readFile(leases()), "0\n");
@@ -320,7 +320,7 @@ TEST_F(DataTest, RestoreNeedsACompleteSavedCopy) {
 
 // --- lock and command line -----------------------------------------------------------------------------------------
 
-TEST_F(DataTest, NothingIsReadOrChangedWhileAProcessUsesTheDirectory) {
+TEST_F(DataTest, CommandsAreRefusedWhileAProcessUsesTheDirectory) {
     const std::string before = exported().dump();
     EXPECT_THAT(create("L3"), isAnswered(1));
     const std::string owner =

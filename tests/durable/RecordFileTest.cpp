@@ -272,7 +272,7 @@ TEST_F(RecordFileTest, CopiesAreUsedIfTheFileNameHasWordsOfTheirLastLine) {
     }
 }
 
-TEST_F(RecordFileTest, WithoutAnyFileThereIsNothingToRecover) {
+TEST_F(RecordFileTest, WithoutFilesThereIsNothingToRecover) {
     EXPECT_THAT(file.recover(), IsEmpty());
     EXPECT_TRUE(fs::is_empty(directory.path()));
 }

@@ -1,5 +1,5 @@
-# Temporary machines with stand-ins for the object managers' commands, and expectations. Source this file with the
-# variables root, program and data as in register-test, and here, the directory of this file.
+# Functions that set up a temporary machine with stand-ins for the object managers' commands, and check its state.
+# Source this file with the variables root, program and data as in register-test; `here` is the directory of this file.
 # shellcheck shell=bash disable=SC2034,SC2154 # variables are those of the scripts that source this one
 
 work=$(mktemp -d)

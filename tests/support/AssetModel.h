@@ -24,10 +24,10 @@ struct AssetField {
     const char* property;  ///< the CIM property with the value
     AssetKind kind;
 
-    /** Whether it is the first of the values that repeat each other. */
+    /** Whether it is the first personalized value, which repeats no other. */
     bool isFirst() const { return std::string(property).back() == '1'; }
 
-    /** The stored value of one that a client sends. */
+    /** The value that is stored if a client sends this one. */
     std::string kept(const std::string& given) const;
 };
 

@@ -96,7 +96,7 @@ const void* tableOf(const Handle* handle) {
     }
 }
 
-/** The object that a function is called on; null where there is none. */
+/** The object of a call; null if the function has none. */
 template <class First, class... Others>
 const void* objectOfCall(First first, Others...) {
     if constexpr (hasTable<First>) {
@@ -137,7 +137,7 @@ inline void setStatus(CMPIStatus* status, CMPIrc rc) {
 template <class Other>
 void setStatus(const Other&, CMPIrc) {}
 
-/** The answer of a function that does nothing. */
+/** The result of a function that fails or returns null. */
 template <class Result>
 Result emptyAnswer(const InjectedResult& result) {
     if constexpr (std::is_same_v<Result, CMPIStatus>) {

@@ -13,7 +13,7 @@ std::set<std::string>& names() {
     return all;
 }
 
-/** Puts the recording function into a slot that holds the real one. */
+/** Replaces the function in a slot by the recording function. */
 template <auto slot, class Table>
 void record(Table& table, const char* name) {
     Recorded<slot>::name = name;
@@ -22,7 +22,7 @@ void record(Table& table, const char* name) {
     names().insert(name);
 }
 
-// The functions with a variable number of arguments take none of the templates' roads.
+// The templates do not support functions with a variable number of arguments.
 
 constexpr const char* getMessageName = "CMPIBrokerEncFT.getMessage";
 constexpr const char* getMessage2Name = "CMPIBrokerEncFT.getMessage2";

@@ -9,7 +9,7 @@
 
 namespace {
 
-/** Whether all pointers of a table are set. The numbers before them have the size of a pointer. */
+/** Whether all functions of a table are set. The version numbers before them have the size of one pointer. */
 template <class Table>
 bool isFilled(const Table& table) {
     std::array<const void*, sizeof(Table) / sizeof(void*)> words{};
@@ -18,7 +18,7 @@ bool isFilled(const Table& table) {
     return std::find(words.begin() + 1, words.end(), nullptr) == words.end();
 }
 
-TEST(FunctionTablesTest, HaveNoEmptySlot) {
+TEST(FunctionTablesTest, HaveNoNullFunctions) {
     const cimhost::FunctionTables& tables = cimhost::standardTables();
     EXPECT_TRUE(isFilled(tables.broker));
     EXPECT_TRUE(isFilled(tables.encapsulation));
@@ -82,7 +82,7 @@ protected:
     const cimhost::FunctionTables& tables = cimhost::standardTables();
 };
 
-TEST_F(BadArgumentsTest, NoObjectIsAnInvalidHandle) {
+TEST_F(BadArgumentsTest, ANullObjectIsAnInvalidHandle) {
     const auto& s = tables.string;
     expectNullRefused<CMPIString>(s.release, s.clone, s.getCharPtr);
     const auto& p = tables.objectPath;
@@ -110,7 +110,7 @@ TEST_F(BadArgumentsTest, NoObjectIsAnInvalidHandle) {
                                   r.returnError);
 }
 
-TEST_F(BadArgumentsTest, NoErrorObjectIsAnInvalidHandle) {
+TEST_F(BadArgumentsTest, ANullErrorObjectIsAnInvalidHandle) {
     const auto& e = tables.error;
     expectNullRefused<CMPIError>(
         e.release, e.clone, e.getErrorType, e.getOtherErrorType, e.getOwningEntity, e.getMessageID, e.getMessage,
@@ -121,7 +121,7 @@ TEST_F(BadArgumentsTest, NoErrorObjectIsAnInvalidHandle) {
         e.setOtherErrorSourceFormat, e.setCIMStatusCodeDescription, e.setMessageArguments);
 }
 
-TEST_F(BadArgumentsTest, NoBrokerIsAnInvalidHandle) {
+TEST_F(BadArgumentsTest, ANullBrokerIsAnInvalidHandle) {
     const auto& b = tables.broker;
     expectNullRefused<CMPIBroker>(b.attachThread, b.detachThread, b.deliverIndication, b.enumerateInstanceNames,
                                   b.getInstance, b.createInstance, b.modifyInstance, b.deleteInstance, b.execQuery,
@@ -190,7 +190,7 @@ TEST_F(BadArgumentsTest, AnObjectOfAnotherTypeIsAnInvalidHandle) {
     EXPECT_EQ(tables.string.release(string).rc, CMPI_RC_ERR_INVALID_HANDLE);
 }
 
-TEST_F(BadArgumentsTest, StatusPlacesMayBeNull) {
+TEST_F(BadArgumentsTest, TheStatusPointerMayBeNull) {
     EXPECT_EQ(tables.string.getCharPtr(nullptr, nullptr), nullptr);
     EXPECT_EQ(make().newString(handle(), nullptr, nullptr), nullptr);
     EXPECT_EQ(make().newObjectPath(nullptr, nullptr, nullptr, nullptr), nullptr);

@@ -45,7 +45,7 @@ TEST_F(BrokerConcurrencyTest, ObjectsBelongToTheRequestOfTheirThread) {
     EXPECT_EQ(scope->arena().size(), before);
 }
 
-TEST_F(BrokerConcurrencyTest, ClonesOutliveTheirRequestsAndEndWithTheirRelease) {
+TEST_F(BrokerConcurrencyTest, ClonesExistUntilTheyAreReleased) {
     const std::size_t before = broker.lasting().size();
     inManyRequests([&](RequestScope&, const std::string& name) {
         CMPIString* copy = nullptr;

@@ -38,7 +38,7 @@ TEST_F(InstanceTest, ReturnsItsPathUnchanged) {
     EXPECT_EQ(characters(own->ft->toString(own, nullptr)), "root/cimv2:VELKO_Thing.Name=\"n\"");
 }
 
-TEST_F(InstanceTest, TakesAnotherPath) {
+TEST_F(InstanceTest, SetsAnotherPath) {
     CMPIInstance* instance = newInstance();
     EXPECT_EQ(instance->ft->setObjectPath(instance, newPath("Other")).rc, CMPI_RC_OK);
     const CMPIObjectPath* own = instance->ft->getObjectPath(instance, nullptr);
@@ -46,7 +46,7 @@ TEST_F(InstanceTest, TakesAnotherPath) {
     EXPECT_EQ(instance->ft->setObjectPath(instance, nullptr).rc, CMPI_RC_ERR_INVALID_PARAMETER);
 }
 
-TEST_F(InstanceTest, KeepsPropertiesInTheOrderOfTheirFirstSetting) {
+TEST_F(InstanceTest, ReturnsPropertiesInTheOrderOfTheirFirstSetting) {
     CMPIInstance* instance = newInstance();
     set(instance, "B", "1");
     set(instance, "A", "2");
@@ -65,14 +65,14 @@ TEST_F(InstanceTest, SetsATypedNull) {
     EXPECT_EQ(data.state, CMPI_nullValue);
 }
 
-TEST_F(InstanceTest, TakesANullStringPointerForNull) {
+TEST_F(InstanceTest, TreatsANullStringPointerAsNull) {
     CMPIInstance* instance = newInstance();
     const CMPIValue value{};
     EXPECT_EQ(instance->ft->setProperty(instance, "S", &value, CMPI_string).rc, CMPI_RC_OK);
     EXPECT_EQ(instance->ft->getProperty(instance, "S", nullptr).state, CMPI_nullValue);
 }
 
-TEST_F(InstanceTest, KeepsEveryPlainType) {
+TEST_F(InstanceTest, StoresEveryPlainType) {
     CMPIInstance* instance = newInstance();
     CMPIValue value{};
     value.sint64 = -5;
@@ -96,7 +96,7 @@ TEST_F(InstanceTest, KeepsEveryPlainType) {
     EXPECT_EQ(instance->ft->getProperty(instance, "S8", nullptr).type, CMPI_sint8);
 }
 
-TEST_F(InstanceTest, KeepsAnEmbeddedInstance) {
+TEST_F(InstanceTest, StoresAnEmbeddedInstance) {
     CMPIInstance* inner = newInstance("Inner");
     set(inner, "P", "1");
     CMPIInstance* outer = newInstance();
@@ -179,7 +179,7 @@ TEST_F(KnownClassTest, AnInstanceStartsWithTheKeysOfItsPath) {
     EXPECT_EQ(instance->ft->getProperty(instance, "Name", nullptr).state, CMPI_keyValue);
 }
 
-TEST_F(KnownClassTest, AKeyIsWhereItIsSet) {
+TEST_F(KnownClassTest, AKeyMovesToThePositionWhereItIsSet) {
     CMPIInstance* instance = known();
     const CMPIValue number = uint32Value(7);
     instance->ft->setProperty(instance, "Other", &number, CMPI_uint32);
@@ -191,7 +191,7 @@ TEST_F(KnownClassTest, AKeyIsWhereItIsSet) {
     EXPECT_EQ(key.state, CMPI_keyValue);
 }
 
-TEST_F(KnownClassTest, AKeySetAgainStaysWhereItIs) {
+TEST_F(KnownClassTest, AKeySetAgainKeepsItsPosition) {
     CMPIInstance* instance = known();
     const CMPIValue number = uint32Value(7);
     set(instance, "Name", "first");
@@ -202,7 +202,7 @@ TEST_F(KnownClassTest, AKeySetAgainStaysWhereItIs) {
     EXPECT_EQ(characters(key.value.string), "second");
 }
 
-TEST_F(KnownClassTest, AKeyOfACloneIsWhereTheCloneSetsIt) {
+TEST_F(KnownClassTest, AKeyOfACloneMovesWhenTheCloneSetsIt) {
     CMPIInstance* original = known();
     CMPIInstance* clone = original->ft->clone(original, &status);
     ASSERT_NE(clone, nullptr);

@@ -43,7 +43,7 @@ TEST_F(LifetimeTest, UseAfterReleaseIsReported) {
     EXPECT_EQ(string->ft->release(string).rc, CMPI_RC_ERR_INVALID_HANDLE);
 }
 
-TEST_F(LifetimeTest, AReleasedObjectIsNoArgument) {
+TEST_F(LifetimeTest, AReleasedObjectIsAnInvalidArgument) {
     CMPIObjectPath* path = newPath();
     path->ft->release(path);
     EXPECT_EQ(make().newInstance(handle(), path, &status), nullptr);
@@ -159,7 +159,7 @@ TEST_F(LifetimeTest, APreparedThreadThatIsNeverAttachedIsFreed) {
     EXPECT_NE(handle()->bft->prepareAttachThread(handle(), scope->context({})), nullptr);
 }
 
-TEST_F(LifetimeTest, RequestsOfSeveralThreadsDoNotMeet) {
+TEST_F(LifetimeTest, RequestsOfSeveralThreadsOwnSeparateObjects) {
     const auto work = [this](const char* text) {
         for (int i = 0; i < 200; ++i) {
             cimhost::RequestScope request(broker);

@@ -13,7 +13,7 @@ protected:
     CMPIData get(const CMPIInstance* instance) { return instance->ft->getProperty(instance, "Text", &status); }
 };
 
-TEST_F(MissingCharacters, AStringObjectMayHaveNone) {
+TEST_F(MissingCharacters, AStringObjectMayHaveNoCharacters) {
     const CMPIData data = get(instanceWith(cimhost::Value::stringWithoutCharacters()));
     EXPECT_EQ(status.rc, CMPI_RC_OK);
     EXPECT_EQ(data.state, CMPI_goodValue);
@@ -29,14 +29,14 @@ TEST_F(MissingCharacters, ANullStringMayBeAnObject) {
     EXPECT_EQ(data.value.string->ft->getCharPtr(data.value.string, nullptr), nullptr);
 }
 
-TEST_F(MissingCharacters, AClonedStringHasNoneEither) {
+TEST_F(MissingCharacters, ACloneOfSuchAStringHasNoCharactersEither) {
     const CMPIData data = get(instanceWith(cimhost::Value::stringWithoutCharacters()));
     CMPIString* copy = data.value.string->ft->clone(data.value.string, nullptr);
     EXPECT_EQ(copy->ft->getCharPtr(copy, nullptr), nullptr);
     copy->ft->release(copy);
 }
 
-TEST_F(MissingCharacters, APropertySetToSuchAStringIsNull) {
+TEST_F(MissingCharacters, APropertyThatIsSetToSuchAStringIsNull) {
     const CMPIData data = get(instanceWith(cimhost::Value::stringWithoutCharacters()));
     CMPIInstance* other = newInstance();
     EXPECT_EQ(other->ft->setProperty(other, "Text", &data.value, CMPI_string).rc, CMPI_RC_OK);

@@ -4,7 +4,7 @@ namespace {
 
 class ObjectPathTest : public BrokerTest {};
 
-TEST_F(ObjectPathTest, HasThePartsItWasMadeWith) {
+TEST_F(ObjectPathTest, HasTheNamespaceAndClassOfItsCreation) {
     const CMPIObjectPath* path = newPath("VELKO_Thing");
     EXPECT_EQ(status.rc, CMPI_RC_OK);
     EXPECT_EQ(characters(path->ft->getNameSpace(path, nullptr)), "root/cimv2");
@@ -13,7 +13,7 @@ TEST_F(ObjectPathTest, HasThePartsItWasMadeWith) {
     EXPECT_EQ(path->ft->getKeyCount(path, nullptr), 0U);
 }
 
-TEST_F(ObjectPathTest, TakesOtherParts) {
+TEST_F(ObjectPathTest, SetsNamespaceClassAndHost) {
     CMPIObjectPath* path = newPath();
     path->ft->setNameSpace(path, "root/other");
     path->ft->setClassName(path, "Y");
@@ -45,7 +45,7 @@ TEST_F(ObjectPathTest, FindsAKeyInAnyLetterCase) {
     EXPECT_EQ(characters(key.value.string), "L1");
 }
 
-TEST_F(ObjectPathTest, ReplacesAKeyInItsPlace) {
+TEST_F(ObjectPathTest, ReplacesAKeyAtItsPosition) {
     CMPIObjectPath* path = newPath();
     path->ft->addKey(path, "A", charsValue("1"), CMPI_chars);
     path->ft->addKey(path, "B", charsValue("2"), CMPI_chars);
@@ -73,7 +73,7 @@ TEST_F(ObjectPathTest, ReportsAMissingKey) {
     EXPECT_EQ(status.rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);
 }
 
-TEST_F(ObjectPathTest, KeepsAReferenceAsItWasWhenAdded) {
+TEST_F(ObjectPathTest, CopiesAReferenceWhenItIsAdded) {
     CMPIObjectPath* target = newPath("Target");
     CMPIObjectPath* path = newPath();
     CMPIValue value{};

@@ -37,7 +37,7 @@ TEST_F(ResultTest, CollectsEverythingInOrder) {
     EXPECT_EQ(cimhost::doneCount(events), 2);
 }
 
-TEST_F(ResultTest, KeepsResultsUnchanged) {
+TEST_F(ResultTest, CopiesResultsWhenTheyAreReturned) {
     CMPIInstance* instance = newInstance();
     instance->ft->setProperty(instance, "P", charsValue("before"), CMPI_chars);
     result->ft->returnInstance(result, instance);
@@ -77,7 +77,7 @@ TEST_F(ResultTest, AnErrorHasItsAttributes) {
     EXPECT_EQ(status.rc, CMPI_RC_OK);
 }
 
-TEST_F(ResultTest, AnErrorTakesAttributes) {
+TEST_F(ResultTest, AttributesOfAnErrorCanBeSet) {
     CMPIError* error = newError();
     error->ft->setErrorType(error, SoftwareError);
     error->ft->setErrorSource(error, "there");

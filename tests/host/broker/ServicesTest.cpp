@@ -19,7 +19,7 @@ protected:
     cimhost::Broker logging;
 };
 
-TEST_F(ServicesTest, KnowsTheTypesOfObjects) {
+TEST_F(ServicesTest, ReturnsTheTypesOfObjects) {
     const CMPIString* string = newString("s");
     EXPECT_EQ(characters(make().getType(handle(), string, &status)), "CMPIString");
     EXPECT_EQ(characters(make().getType(handle(), newInstance(), &status)), "CMPIInstance");
@@ -40,7 +40,7 @@ TEST_F(ServicesTest, DescribesObjects) {
     EXPECT_EQ(status.rc, CMPI_RC_ERR_INVALID_HANDLE);
 }
 
-TEST_F(ServicesTest, FillsMessages) {
+TEST_F(ServicesTest, InsertsArgumentsIntoMessages) {
     const CMPIString* message =
         make().getMessage(handle(), "id", "$0 of $1, $2 $3 $9", &status, 4, CMPI_sint32, -1, CMPI_uint64,
                           CMPIUint64{5000000000}, CMPI_chars, "chars", CMPI_string, newString("string"));
@@ -50,7 +50,7 @@ TEST_F(ServicesTest, FillsMessages) {
     EXPECT_EQ(characters(message), "true 0.500000");
 }
 
-TEST_F(ServicesTest, LeavesMessagesWithBadInsertsAsTheyAre) {
+TEST_F(ServicesTest, LeavesMessagesWithBadInsertsUnchanged) {
     EXPECT_EQ(characters(make().getMessage(handle(), "id", "a $0", &status, 1, CMPI_instance, nullptr)), "a $0");
     EXPECT_EQ(status.rc, CMPI_RC_ERR_TYPE_MISMATCH);
     EXPECT_EQ(characters(make().getMessage(handle(), "id", "a $0", &status, 11)), "a $0");
@@ -73,7 +73,7 @@ TEST_F(ServicesTest, HasNoQueries) {
     EXPECT_EQ(projection, nullptr);
 }
 
-TEST_F(ServicesTest, PassesLogAndTraceRecordsOn) {
+TEST_F(ServicesTest, PassesLogAndTraceRecordsToTheLogger) {
     const CMPIBroker* loggingHandle = logging.handle();
     EXPECT_EQ(make().logMessage(loggingHandle, CMPI_SEV_WARNING, "id", "text", newString("ignored")).rc, CMPI_RC_OK);
     EXPECT_EQ(make().trace(loggingHandle, CMPI_LEV_VERBOSE, "part", nullptr, newString("string")).rc, CMPI_RC_OK);
@@ -143,7 +143,7 @@ void* arrive(void* argument) {
     return nullptr;
 }
 
-TEST_F(ServicesTest, ThreadsMeetAtConditions) {
+TEST_F(ServicesTest, ThreadsSynchronizeWithConditions) {
     const CMPIBrokerExtFT& threads = *handle()->xft;
     Meeting meeting{&threads, threads.newMutex(0), threads.newCondition(0)};
     threads.lockMutex(meeting.mutex);

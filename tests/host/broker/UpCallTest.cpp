@@ -59,7 +59,7 @@ protected:
     const CMPIContext* context = request.context({testsupport::named("Mine", testsupport::text("kept"))});
 };
 
-TEST_F(UpCallTest, AnEnumerationIsWalkedThroughOnce) {
+TEST_F(UpCallTest, AnEnumerationCanBeIteratedOnce) {
     const CMPIEnumeration* found = up().enumerateInstances(caller(), context, newPath("First"), nullptr, &status);
     ASSERT_EQ(status.rc, CMPI_RC_OK);
     EXPECT_EQ(found->ft->hasNext(found, &status), 1);
@@ -95,7 +95,7 @@ TEST_F(UpCallTest, AFilterDistinguishesNullAndEmpty) {
     EXPECT_EQ(echo.last.filter.resultRole, "Role");
 }
 
-TEST_F(UpCallTest, SingleObjectsAreObjects) {
+TEST_F(UpCallTest, OperationsForOneObjectReturnIt) {
     const CMPIInstance* instance = up().getInstance(caller(), context, newPath(), nullptr, &status);
     ASSERT_EQ(status.rc, CMPI_RC_OK);
     EXPECT_EQ(instance->ft->getProperty(instance, "P", nullptr).value.uint32, 1U);

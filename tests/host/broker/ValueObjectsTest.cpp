@@ -12,7 +12,7 @@ TEST_F(ArrayTest, StartsWithNullElements) {
     EXPECT_EQ(array->ft->getElementAt(array, 2, nullptr).state, CMPI_nullValue);
 }
 
-TEST_F(ArrayTest, KeepsItsElements) {
+TEST_F(ArrayTest, StoresItsElements) {
     CMPIArray* array = make().newArray(handle(), 2, CMPI_chars, nullptr);
     EXPECT_EQ(array->ft->getSimpleType(array, nullptr), CMPI_string);
     EXPECT_EQ(array->ft->setElementAt(array, 1, charsValue("x"), CMPI_chars).rc, CMPI_RC_OK);

@@ -32,7 +32,7 @@ class Unserved { [Key] string Name; };
 [Association] class Link { [Key] Base REF From; [Key] Other REF To; };
 )";
 
-/** Records the requests that it receives, and answers them with a function. */
+/** Records the requests that it receives, and calls a function for the responses. */
 class FakeManager : public UpCalls {
 public:
     Response perform(Request request) override {

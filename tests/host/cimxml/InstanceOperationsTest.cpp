@@ -71,7 +71,7 @@ TEST_F(InstanceOperationsTest, ClassesWithoutProvidersHaveNoInstances) {
     EXPECT_THAT(manager.requests, IsEmpty());
 }
 
-TEST_F(InstanceOperationsTest, ThereAreFewParametersPropertiesAndKeys) {
+TEST_F(InstanceOperationsTest, ParametersPropertiesAndKeysAreLimitedInNumber) {
     const std::string twice = className("ClassName", "Base") + className("classname", "Base");
     EXPECT_EQ(statusOf(response("EnumerateInstances", twice)), CMPI_RC_ERR_INVALID_PARAMETER);
     std::string keys;
@@ -97,7 +97,7 @@ TEST_F(InstanceOperationsTest, ThereAreFewParametersPropertiesAndKeys) {
     EXPECT_THAT(manager.requests, IsEmpty());
 }
 
-TEST_F(InstanceOperationsTest, CharactersThatXmlCannotRepresentAreAnError) {
+TEST_F(InstanceOperationsTest, CharactersThatXmlCannotRepresentFailTheResponse) {
     manager.answer = [](const Request&) {
         return Response::ofInstances({instanceOf("Other", "a", {{"Letter", Value::of(CMPI_char16, Char16{1})}})});
     };
@@ -144,7 +144,7 @@ TEST_F(InstanceOperationsTest, AllTypesOfValuesAreWritten) {
     EXPECT_EQ(text.rfind("<?xml version=\"1.0\" encoding=\"utf-8\"?>\n<CIM ", 0), 0U);
 }
 
-TEST_F(InstanceOperationsTest, CharactersThatXmlLacksFailTheRequest) {
+TEST_F(InstanceOperationsTest, StringsThatXmlCannotRepresentFailTheResponse) {
     manager.answer = [](const Request&) {
         return Response::ofInstances({instanceOf("Base", "a", {{"Text", Value::of("b\x01")}})});
     };
@@ -165,7 +165,7 @@ TEST_F(InstanceOperationsTest, RealNumbersHaveADecimalPoint) {
     }
 }
 
-TEST_F(InstanceOperationsTest, CharactersOfPropertiesThatTheClientDoesNotWantAreNoError) {
+TEST_F(InstanceOperationsTest, CharactersOfPropertiesOutsideOfTheListAreNoError) {
     manager.answer = [](const Request& request) {
         return Response::ofInstances({instanceOf(request.path.className, "a", {{"Text", Value::of("b\x01")}})});
     };

@@ -46,7 +46,7 @@ TEST_F(MessageTest, RefusesOtherVersions) {
     EXPECT_EQ(refusalOf(replaced(valid, "PROTOCOLVERSION=\"1.0\"", "PROTOCOLVERSION=\"1.4\"")), "accepted");
 }
 
-TEST_F(MessageTest, RefusesWhatIsNotARequest) {
+TEST_F(MessageTest, RefusesDocumentsThatAreNoRequest) {
     EXPECT_EQ(refusalOf("{}"), "400 request-not-well-formed");
     EXPECT_EQ(refusalOf("<A/>"), "400 request-not-loosely-valid");
     EXPECT_EQ(refusalOf("<CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\"/>"), "400 request-not-loosely-valid");
@@ -55,7 +55,7 @@ TEST_F(MessageTest, RefusesWhatIsNotARequest) {
               "400 request-not-loosely-valid");
 }
 
-TEST_F(MessageTest, RefusesElementsThatAreThereTwice) {
+TEST_F(MessageTest, RefusesDuplicateElements) {
     const std::string nameSpace = "<LOCALNAMESPACEPATH><NAMESPACE NAME=\"root\"/></LOCALNAMESPACEPATH>";
     const std::string call = "<IMETHODCALL NAME=\"GetClass\">" + nameSpace + "</IMETHODCALL>";
     for (const std::string& second : {call, "<METHODCALL NAME=\"x\"><LOCALCLASSPATH>" + nameSpace +
@@ -115,7 +115,7 @@ TEST_F(MessageTest, MethodsAreFoundButNotAvailable) {
     EXPECT_EQ(call("Resize", "Nothing"), CMPI_RC_ERR_INVALID_CLASS);
 }
 
-TEST_F(MessageTest, WritingNeedsTheRight) {
+TEST_F(MessageTest, WriteOperationsRequireTheRightToWrite) {
     const Caller reader{"reader", false};
     EXPECT_EQ(statusOf(respondedTo(valid, reader)), 0);
     const std::string deletion = request("DeleteInstance", parameter("InstanceName", instanceName("Base", "a")));

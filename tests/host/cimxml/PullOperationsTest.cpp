@@ -52,7 +52,7 @@ TEST_F(PullOperationsTest, AnEnumerationIsReadInParts) {
     EXPECT_EQ(statusOf(pull(context, 2)), 21);
 }
 
-TEST_F(PullOperationsTest, OpeningReturnsNothingUnlessAsked) {
+TEST_F(PullOperationsTest, OpeningReturnsNoObjectsByDefault) {
     const XmlElement opened = open("", "OpenEnumerateInstancePaths");
     EXPECT_TRUE(returned(opened).empty());
     const XmlElement paths = pull(outputOf(opened, "EnumerationContext"), 100, "PullInstancePaths");
@@ -80,7 +80,7 @@ TEST_F(PullOperationsTest, AClosedEnumerationIsUnknown) {
     EXPECT_EQ(statusOf(response("CloseEnumeration", value("EnumerationContext", context))), 21);
 }
 
-TEST_F(PullOperationsTest, OtherKindsOtherNamespacesAndOtherUsersCannotPull) {
+TEST_F(PullOperationsTest, AnEnumerationIsPulledOnlyByItsUserInItsNamespaceAndKind) {
     const std::string context = outputOf(open(""), "EnumerationContext");
     EXPECT_EQ(statusOf(pull(context, 1, "PullInstancePaths")), 21);
     const std::string parameters = value("EnumerationContext", context) + value("MaxObjectCount", "1");
@@ -104,7 +104,7 @@ TEST_F(PullOperationsTest, LimitsAndUnsupportedOptionsHaveTheirStatus) {
               CMPI_RC_ERR_INVALID_PARAMETER);
 }
 
-TEST_F(PullOperationsTest, OpenEnumerationsTogetherHaveALimitOfResults) {
+TEST_F(PullOperationsTest, ResultsOfAllOpenEnumerationsAreLimited) {
     options.limits.results = 9;
     const std::string context = outputOf(open(value("MaxObjectCount", "1")), "EnumerationContext");  // 4 remain
     EXPECT_EQ(statusOf(open("")), 0);

@@ -5,7 +5,7 @@ namespace {
 
 using ResponseTextTest = CimXmlTest;
 
-TEST_F(ResponseTextTest, ResultsAreWrittenWhenTheyAreAskedFor) {
+TEST_F(ResponseTextTest, ResultsAreWrittenOnDemand) {
     const Message message = readMessage(request("EnumerateInstances", className("ClassName", "Other")));
     std::size_t written = 0;
     OperationResult result;

@@ -91,7 +91,7 @@ TEST(XmlWriterTest, EscapesWithNamedEntitiesOnly) {
     EXPECT_EQ(xml, "a&lt;b&gt;&amp;&quot;c&apos;\n\xC3\xA4");
 }
 
-TEST(XmlElementTest, ElementsHaveFewAttributes) {
+TEST(XmlElementTest, TheNumberOfAttributesIsLimited) {
     const auto attributes = [](int count) {
         std::string names;
         for (int i = 0; i < count; ++i) {
@@ -109,7 +109,7 @@ TEST(XmlElementTest, ElementsHaveFewAttributes) {
     EXPECT_THROW(parseXml("<A" + attributes(100'000) + "/>"), XmlError);
 }
 
-TEST(XmlWriterTest, KnowsWhatXmlCanRepresent) {
+TEST(XmlWriterTest, RecognizesStringsThatXmlCanRepresent) {
     EXPECT_TRUE(isRepresentable("a\t\r\n\xC3\xA4\xF0\x9F\x98\x80"));
     for (const char* string : {"\x01", "a\x1F", "\xFF", "\xC3", "\xEF\xBF\xBF", "\xED\xA0\x80"}) {
         EXPECT_FALSE(isRepresentable(string)) << string;

@@ -36,13 +36,13 @@ TEST(GetInstance, ShowsOneInstance) {
     EXPECT_EQ(got.output, "root/cimv2:Test_Box.Name=\"B\"\n  Name  string  \"B\"\n  Note  string  NULL\n");
 }
 
-TEST(GetInstance, PassesThePropertyListOn) {
+TEST(GetInstance, PassesThePropertyListToTheProvider) {
     EXPECT_THAT(run({"gi", boxA, "--property", "Size", "--property", "Open"}).output,
                 HasSubstr("\"asked for Size Open\""));
     EXPECT_THAT(run({"gi", boxA}).output, Not(HasSubstr("asked for")));
 }
 
-TEST(GetInstance, TakesTheNamespaceFromThePathOrFromTheOption) {
+TEST(GetInstance, ReadsTheNamespaceFromThePathOrTheOption) {
     EXPECT_THAT(run({"gi", "root/other:Test_Box.Name=\"A\""}).output, StartsWith("root/other:Test_Box"));
     EXPECT_THAT(run({"--namespace", "root/other", "gi", boxA}).output, StartsWith("root/other:Test_Box"));
     EXPECT_THAT(run({"gi", boxA, "--namespace", "root/other"}).output, StartsWith("root/other:Test_Box"));
@@ -61,7 +61,7 @@ TEST(CreateInstance, ShowsThePathOfTheNewInstance) {
     EXPECT_EQ(created.output, "root/cimv2:Test_Box.Name=\"new\"\n");
 }
 
-TEST(CreateInstance, GivesTheProviderKeysAndValues) {
+TEST(CreateInstance, PassesKeysAndValuesToTheProvider) {
     const ProgramResult created = run({"--raw", "ci", "Test_Box.Name=\"new\"", "Size=3", "--null", "Note"});
     EXPECT_THAT(created.output, HasSubstr(R"(2. instance root/cimv2:Test_Box.Name="new"
      Name  string  "new"
@@ -85,14 +85,14 @@ TEST(CreateInstance, AnExistingInstanceIsError11) {
     EXPECT_EQ(created.error, "cimhost: error 11 (CMPI_RC_ERR_ALREADY_EXISTS): there is a box A\n");
 }
 
-TEST(ModifyInstance, SaysNothingWhenItSucceeds) {
+TEST(ModifyInstance, PrintsNothingIfItSucceeds) {
     const ProgramResult modified = run({"mi", boxA, "Size=5"});
     EXPECT_EQ(modified.status, 0);
     EXPECT_EQ(modified.output, "");
     EXPECT_EQ(modified.error, "");
 }
 
-TEST(ModifyInstance, TypesEveryValueByTheClass) {
+TEST(ModifyInstance, ConvertsEachValueToTheTypeOfTheProperty) {
     const ProgramResult modified =
         run({"--raw", "modify-instance", boxA, "Size=0x10", "open=TRUE", "Packed=20260131120000.000000+060",
              "Labels={\"a, b\", \"c\"}", "Shelf=-128", "Mark=x", "Weight=1", "Inside=Test_Box.Name=\"B\"",
@@ -119,7 +119,7 @@ TEST(ModifyInstance, AFailureWithoutAMessageStillHasItsCode) {
     EXPECT_THAT(modified.error, StartsWith("cimhost: error 6 (CMPI_RC_ERR_NOT_FOUND)"));
 }
 
-TEST(DeleteInstance, SaysNothingWhenItSucceedsAndWhyWhenItDoesNot) {
+TEST(DeleteInstance, PrintsOnlyTheReasonOfAFailure) {
     const ProgramResult deleted = run({"di", boxA});
     EXPECT_EQ(deleted.status, 0);
     EXPECT_EQ(deleted.output + deleted.error, "");
@@ -136,7 +136,7 @@ TEST(Associators, ShowTheInstancesAtTheOtherEnd) {
     EXPECT_THAT(found.output, StartsWith("root/cimv2:Test_Box.Name=\"B\"\n"));
 }
 
-TEST(Associators, PassTheirFiltersOn) {
+TEST(Associators, PassTheirFiltersToTheProvider) {
     const ProgramResult found = run({"ain", boxA, "--assoc-class", "Test_Contains", "--result-class", "Test_Box",
                                      "--role", "Outer", "--result-role", "Inner"});
     EXPECT_EQ(found.output, "root/cimv2:Test_Box.Name=\"Test_Contains|Test_Box|Outer|Inner\"\n");

@@ -55,7 +55,7 @@ TEST(JsonOutput, AssociationsHavePathsAsValues) {
     EXPECT_EQ(links[0]["path"]["keys"]["Outer"]["value"]["class"], "Test_Box");
 }
 
-TEST(JsonOutput, CreationGivesThePath) {
+TEST(JsonOutput, CreationReturnsThePath) {
     EXPECT_EQ(jsonOf({"ci", "Test_Box.Name=\"new\""})["uri"], "root/cimv2:Test_Box.Name=\"new\"");
 }
 

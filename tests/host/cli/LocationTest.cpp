@@ -18,20 +18,20 @@ Environment testEnvironment() {
             std::string("CIMHOST_LIBRARY_PATH=/:") + PROVIDER_DIRECTORY};
 }
 
-TEST(Location, ComesFromTheEnvironment) {
+TEST(Location, IsReadFromTheEnvironment) {
     const ProgramResult listed = runBare({"ein", "Test_Box"}, testEnvironment());
     EXPECT_EQ(listed.status, 0) << listed.error;
     EXPECT_THAT(listed.output, HasSubstr("Test_Box.Name=\"A\""));
 }
 
-TEST(Location, OptionsComeBeforeTheEnvironment) {
+TEST(Location, OptionsOverrideTheEnvironment) {
     const testsupport::TemporaryDirectory directory;
     const std::string other = directory.write("other.mof", "class Other { [Key] string K; };");
     const ProgramResult listed = runBare({"--schema", other, "classes"}, testEnvironment());
     EXPECT_THAT(listed.output, AllOf(StartsWith("Other "), HasSubstr("Test_Box"), HasSubstr("(not in the schema)")));
 }
 
-TEST(Location, ADirectoryMeansItsFilesAndSeveralCanBeNamed) {
+TEST(Location, MayNameSeveralFilesAndDirectories) {
     const testsupport::TemporaryDirectory directory;
     directory.write("a/2.mof", "class Two : One {};");
     directory.write("a/1.mof", "class One { [Key] string K; };");
@@ -66,7 +66,7 @@ TEST(Location, AGateReplacesTheProviderOfItsClassesUnlessTheBareOneIsChosen) {
     EXPECT_THAT(refused.error, HasSubstr("CIMHOST_PROVIDER is \"other\"; set it to gate or bare"));
 }
 
-TEST(Location, WithoutAnyItIsTheDataDirectoryBesideTheProgram) {
+TEST(Location, IsTheDataDirectoryBesideTheProgramByDefault) {
     const ProgramResult listed = runBare({"classes"});
     EXPECT_EQ(listed.status, 0) << listed.error;
     EXPECT_NE(listed.output, "");
@@ -107,7 +107,7 @@ TEST(CannotLoad, ADirectoryWithoutSuchFilesNamesTheOption) {
     EXPECT_THAT(refused.error, AllOf(HasSubstr("no schema"), HasSubstr("--schema"), HasSubstr("CIMHOST_SCHEMA")));
 }
 
-TEST(CannotLoad, ALibraryThatIsNone) {
+TEST(CannotLoad, AFileThatIsNoLibrary) {
     const testsupport::TemporaryDirectory directory;
     directory.write("libcli_test_provider.so", "this is no library");
     const ProgramResult refused =

@@ -24,7 +24,7 @@ TEST(RawOutput, CountsEveryReturnDone) {
     EXPECT_EQ(got.status, 0) << "the provider's status, not what an object manager makes of it";
 }
 
-TEST(RawOutput, ShowsTheStatusOfAFailureAndSaysItOnStandardErrorToo) {
+TEST(RawOutput, ShowsTheStatusOfAFailureAlsoOnStandardError) {
     const ProgramResult failed = run({"--raw", "gi", "Test_Answer.Code=2"});
     EXPECT_EQ(failed.status, 1);
     EXPECT_EQ(failed.output,
@@ -54,7 +54,7 @@ TEST(RawOutput, DistinguishesAnExceptionFromAMessage) {
     EXPECT_THAT(thrown.output, testing::HasSubstr("wit's end"));
 }
 
-TEST(RawOutput, WithoutAProviderIsOnlyTheError) {
+TEST(RawOutput, IsOnlyTheErrorWithoutAProvider) {
     const ProgramResult failed = run({"--raw", "ei", "Test_Unserved"});
     EXPECT_EQ(failed.status, 1);
     EXPECT_EQ(failed.output, "");

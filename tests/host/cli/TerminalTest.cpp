@@ -39,7 +39,7 @@ TEST(Colours, AreForTerminalsOnly) {
     EXPECT_THAT(run({"gi", "Test_Box.Name=\"none\""}).error, Not(HasSubstr(escape)));
 }
 
-TEST(Colours, AreOmittedIfTheyAreNotWanted) {
+TEST(Colours, AreOmittedOnRequest) {
     for (const char* variable : {"NO_COLOR=1", "TERM=dumb"}) {
         const ProgramResult shown = runOnTerminal({"ei", "Test_Box"}, wideTerminal, {variable});
         EXPECT_EQ(shown.output, run({"ei", "Test_Box"}).output) << variable;
@@ -64,7 +64,7 @@ TEST(Colours, AreNotForPrograms) {
     }
 }
 
-TEST(Colours, HaveThreeWords) {
+TEST(Colours, OptionHasThreeValues) {
     const ProgramResult refused = run({"--color", "blue", "ei", "Test_Box"});
     EXPECT_EQ(refused.status, 2);
     EXPECT_THAT(refused.error, HasSubstr("blue not in {auto,always,never}"));
@@ -103,7 +103,7 @@ TEST(Window, CanBeSetByAVariable) {
               runOnTerminal({"ei", "Test_Box"}, 40).output);
 }
 
-TEST(Window, CountsOnTerminalsOnly) {
+TEST(Window, WidthAppliesToTerminalsOnly) {
     const std::vector<std::string> line{"--schema",
                                         dataFile("test.mof"),
                                         "--registration",

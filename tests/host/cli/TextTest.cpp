@@ -50,7 +50,7 @@ TEST(TextOutput, ListsClassesWithTheirProviders) {
         "the schema)\n");
 }
 
-TEST(MofOutput, ShowsInstancesAsAMofCompilerTakesThem) {
+TEST(MofOutput, ShowsInstancesAsAMofCompilerAcceptsThem) {
     const ProgramResult listed = run({"--format", "mof", "ei", "Test_Box"});
     EXPECT_EQ(listed.status, 0);
     EXPECT_EQ(listed.output, R"(instance of Test_Box {

@@ -35,7 +35,7 @@ protected:
     }
 };
 
-TEST_F(LoadingTest, FactoriesAreCalledOnceAnInterface) {
+TEST_F(LoadingTest, FactoriesAreCalledOncePerInterface) {
     ask("Sample_Thing");
     ask("Sample_Silent");
     manager().perform(Request::associatorNames(named("Sample_Thing", "x"), {}));
@@ -50,7 +50,7 @@ TEST_F(LoadingTest, NothingIsLoadedBeforeItIsNeeded) {
     EXPECT_FALSE(isLoaded("libSampleProvider.so"));
 }
 
-TEST_F(LoadingTest, TheEndCleansUpAndUnloads) {
+TEST_F(LoadingTest, TheDestructorCleansUpProvidersAndUnloadsLibraries) {
     ask("Sample_Thing");
     manager().perform(Request::associatorNames(named("Sample_Thing", "x"), {}));
     EXPECT_TRUE(isLoaded("libSampleProvider.so"));
@@ -60,13 +60,13 @@ TEST_F(LoadingTest, TheEndCleansUpAndUnloads) {
     EXPECT_FALSE(isLoaded("libSampleProvider.so"));
 }
 
-TEST_F(LoadingTest, AProviderThatWantsToStayStays) {
+TEST_F(LoadingTest, AProviderThatRefusesToBeUnloadedStaysLoaded) {
     ask("Other_Thing");
     started.reset();
     EXPECT_TRUE(isLoaded("libOtherProvider.so"));
 }
 
-TEST_F(LoadingTest, TheGenericFactoryReceivesTheName) {
+TEST_F(LoadingTest, TheGenericFactoryReceivesTheNameOfTheProvider) {
     const auto found = manager().perform(Request::enumerateInstances(classPath("Other_Thing")));
     ASSERT_EQ(found.instances.size(), 1U);
     EXPECT_EQ(testsupport::stringOf(found.instance().properties, "Provider"), "Anything");

@@ -40,7 +40,7 @@ TEST_F(ObjectManagerTest, CreateInstanceMayReturnAnInstance) {
     EXPECT_EQ(testsupport::toText(created.path()), "root/cimv2:Sample_Thing.Name=\"b\"");
 }
 
-TEST_F(ObjectManagerTest, CreateInstanceMustReturnSomething) {
+TEST_F(ObjectManagerTest, CreateInstanceMustReturnAResult) {
     const auto created = create("Sample_Silent", "c");
     EXPECT_EQ(created.status.rc, CMPI_RC_ERR_FAILED);
     EXPECT_THAT(created.status.message, testing::HasSubstr("returned neither a path nor an instance"));
@@ -71,7 +71,7 @@ TEST_F(ObjectManagerTest, ModifyPassesExactlyTheProperties) {
     EXPECT_EQ(stringOf(found.instance().properties, "Text"), "Colour=blue;");
 }
 
-TEST_F(ObjectManagerTest, AFailureWithoutAMessageReceivesOne) {
+TEST_F(ObjectManagerTest, AFailureWithoutAMessageReceivesADefaultMessage) {
     const auto status = manager().perform(Request::deleteInstance(named("Sample_Thing", "missing"))).status;
     EXPECT_EQ(status.rc, CMPI_RC_ERR_NOT_FOUND);
     EXPECT_FALSE(status.message.empty());
@@ -143,7 +143,7 @@ TEST_F(ObjectManagerTest, AnExceptionOfAProviderIsAFailure) {
     EXPECT_TRUE(manager().perform(Request::enumerateInstances(classPath("Sample_Thing"))).ok()) << "after failures";
 }
 
-TEST_F(ObjectManagerTest, TheResponseHasTheProvidersResponse) {
+TEST_F(ObjectManagerTest, TheResponseContainsThatOfTheProvider) {
     cimhost::Request request;
     request.path = classPath("Sample_Failing");
     auto failing = manager().perform(request);
@@ -203,14 +203,14 @@ TEST_F(ObjectManagerTest, AnAssociationClassSelectsItsProvider) {
     EXPECT_EQ(stringOf(found.instance().properties, "Asked"), "sample_link,Far,Here,none");
 }
 
-TEST_F(ObjectManagerTest, WithoutAClassAllAssociationsAreCalled) {
+TEST_F(ObjectManagerTest, WithoutAClassAllAssociationProvidersAreCalled) {
     const auto found = manager().perform(Request::associatorNames(named("Sample_Thing", "x"), {}));
     ASSERT_EQ(found.paths.size(), 2U);
     EXPECT_EQ(stringOf(found.paths[0].keys, "Asked"), "Sample_Link");
     EXPECT_EQ(stringOf(found.paths[1].keys, "Asked"), "Sample_OtherLink");
 }
 
-TEST_F(ObjectManagerTest, ASuperclassMeansItsAssociations) {
+TEST_F(ObjectManagerTest, ASuperclassSelectsAllItsAssociations) {
     auto shape = std::make_shared<cimhost::ClassInfo>();
     shape->name = "Sample_OtherLink";
     shape->superclasses = {"Sample_AnyLink"};
@@ -230,7 +230,7 @@ TEST_F(ObjectManagerTest, AnUnknownAssociationIsInvalid) {
     EXPECT_THAT(found.status.message, testing::HasSubstr("No association provider"));
 }
 
-TEST_F(ObjectManagerTest, AProviderThatDoesNotSupportAnAssociationOperationIsPassedOver) {
+TEST_F(ObjectManagerTest, AProviderThatDoesNotSupportAnAssociationOperationIsSkipped) {
     const auto found = manager().perform(Request::references(named("Sample_Thing", "x"), {}));
     ASSERT_TRUE(found.ok()) << found.status.message;
     EXPECT_EQ(found.instances.size(), 1U);

@@ -26,7 +26,7 @@ protected:
     ProviderLibrary provider{TEST_PROVIDERS "/libSampleProvider.so", "Sample", broker};
 };
 
-TEST_F(ProviderLibraryTest, LoadingCallsNothing) {
+TEST_F(ProviderLibraryTest, LoadingCallsNoFunctionOfTheProvider) {
     EXPECT_TRUE(broker.calls().empty());
 }
 
@@ -74,7 +74,7 @@ TEST_F(ProviderLibraryTest, ReportsMessagesAndExceptions) {
     EXPECT_THAT(throwing.message, testing::HasSubstr("out of paper"));
 }
 
-TEST_F(ProviderLibraryTest, ProviderMeetsTheOrders) {
+TEST_F(ProviderLibraryTest, ProviderReceivesInjectedFailures) {
     provider.createInstance(thing("a"), testsupport::instance(thing("a")));
     broker.failCall("CMPIResultFT.returnInstance", 1, CMPI_RC_ERR_FAILED);
     EXPECT_TRUE(provider.enumerateInstances(things).instances().empty());
@@ -82,7 +82,7 @@ TEST_F(ProviderLibraryTest, ProviderMeetsTheOrders) {
     EXPECT_TRUE(provider.getInstance(thing("a")).instances().empty()) << "the key has no characters";
 }
 
-TEST_F(ProviderLibraryTest, ProviderMeetsServedInstances) {
+TEST_F(ProviderLibraryTest, ProviderReceivesServedInstances) {
     broker.serve("Other_Thing", {testsupport::instance(objectPath("root/cimv2", "Other_Thing"))});
     const Outcome found = provider.enumerateInstances(objectPath("root/cimv2", "Sample_CallsOther_Thing"));
     ASSERT_EQ(found.instances().size(), 1U);

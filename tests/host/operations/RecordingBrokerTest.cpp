@@ -62,7 +62,7 @@ TEST_F(RecordingBrokerTest, RecordsObjectsThatAreReturned) {
     EXPECT_EQ(cimhost::doneCount(events), 1);
 }
 
-TEST_F(RecordingBrokerTest, ForgetsCalls) {
+TEST_F(RecordingBrokerTest, RemovesRecordedCalls) {
     newPath();
     recorder.forget();
     EXPECT_EQ(recorder.count("CMPIBrokerEncFT.newObjectPath"), 0);
@@ -79,7 +79,7 @@ TEST_F(RecordingBrokerTest, FailsTheChosenCall) {
     EXPECT_EQ(recorder.count("CMPIBrokerEncFT.newObjectPath"), 4) << "the failed call is recorded too";
 }
 
-TEST_F(RecordingBrokerTest, FailsEveryCallUntilItObeys) {
+TEST_F(RecordingBrokerTest, FailsEveryCallUntilItIsReset) {
     recorder.failEvery("CMPIResultFT.returnDone", CMPI_RC_ERR_INVALID_HANDLE);
     cimhost::ResultEvents events;
     const CMPIResult* result = scope.result(events);
@@ -99,7 +99,7 @@ TEST_F(RecordingBrokerTest, FailingGettersReturnZeroOrABadValue) {
     EXPECT_EQ(path->ft->getKeyAt(path, 0, nullptr, &status).state, CMPI_badValue);
 }
 
-TEST_F(RecordingBrokerTest, AnswersNothingWithoutAnError) {
+TEST_F(RecordingBrokerTest, ReturnsNullWithoutAnErrorOnRequest) {
     const CMPIObjectPath* path = newPath();
     recorder.answerNothing("CMPIObjectPathFT.getNameSpace", 1);
     EXPECT_EQ(path->ft->getNameSpace(path, &status), nullptr);
@@ -135,7 +135,7 @@ TEST_F(RecordingBrokerTest, ReturnsTheInjectedKey) {
     EXPECT_EQ(status.rc, CMPI_RC_ERR_NOT_FOUND);
 }
 
-TEST_F(RecordingBrokerTest, ReturnsEachStateThatIsOrderedInEachPlace) {
+TEST_F(RecordingBrokerTest, ReturnsTheInjectedStateFromEachFunction) {
     CMPIObjectPath* path = newPath();
     path->ft->addKey(path, "K", chars("v"), CMPI_chars);
     CMPIInstance* instance = handle()->eft->newInstance(handle(), path, nullptr);
@@ -223,7 +223,7 @@ TEST_F(RecordingBrokerTest, EmulatingRecordsNoCalls) {
     EXPECT_TRUE(recorder.calls().empty());
 }
 
-TEST_F(RecordingBrokerTest, KnowsTheGivenClasses) {
+TEST_F(RecordingBrokerTest, ChecksPropertiesOfKnownClasses) {
     recorder.know([](const std::string& name) {
         auto info = std::make_shared<cimhost::ClassInfo>();
         info->name = name;
@@ -244,7 +244,7 @@ TEST_F(RecordingBrokerTest, RecordsMessages) {
     EXPECT_EQ(status.rc, CMPI_RC_ERR_NOT_SUPPORTED);
 }
 
-TEST_F(RecordingBrokerTest, BrokersAreApart) {
+TEST_F(RecordingBrokerTest, BrokersAreIndependent) {
     RecordingBroker other;
     CMPIObjectPath* mine = newPath();
     const CMPIObjectPath* theirs = other.handle()->eft->newObjectPath(other.handle(), "root", "Other", nullptr);
@@ -254,7 +254,7 @@ TEST_F(RecordingBrokerTest, BrokersAreApart) {
     EXPECT_THAT(other.functions(), ElementsAre("CMPIBrokerEncFT.newObjectPath", "CMPIObjectPathFT.getClassName"));
 }
 
-TEST_F(RecordingBrokerTest, ObjectsForOrdersAreNotCalls) {
+TEST_F(RecordingBrokerTest, CreationOfObjectsForFailuresIsNotRecorded) {
     recorder.objectPath(testsupport::objectPath("root", "X"));
     recorder.instance(testsupport::instance(testsupport::objectPath("root", "X")));
     recorder.string("x");

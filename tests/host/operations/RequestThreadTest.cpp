@@ -33,7 +33,7 @@ TEST(ChainMutex, AChainLocksItAgainOnAnotherThread) {
     EXPECT_TRUE(isLocked);
 }
 
-TEST(ChainMutex, KeepsOtherChainsOut) {
+TEST(ChainMutex, ExcludesOtherChains) {
     cimhost::ChainMutex mutex;
     int counter = 0;
     std::vector<std::thread> threads;

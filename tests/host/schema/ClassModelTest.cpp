@@ -38,7 +38,7 @@ TEST(ClassModel, FindsClassesAndPropertiesInAnyLetterCase) {
     EXPECT_EQ(schema.findClass("Stone")->findProperty("Legs"), nullptr);
 }
 
-TEST(ClassModel, InheritedPropertiesComeFirstAndOverridingOnesTakeTheirPlace) {
+TEST(ClassModel, InheritedPropertiesAreFirstAndOverridingOnesReplaceThem) {
     const Schema schema = schemaOf(animals);
     const Class& penguin = *schema.findClass("Penguin");
     EXPECT_THAT(names(penguin.properties), ElementsAre("Name", "Legs", "Note", "Flies"));
@@ -72,7 +72,7 @@ TEST(ClassModel, ClassQualifiersAreInheritedUnlessRestricted) {
     EXPECT_EQ(schema.findClass("Bird")->findQualifier("Abstract"), nullptr);
 }
 
-TEST(ClassModel, KnowsAncestry) {
+TEST(ClassModel, FindsSuperclassesAndSubclasses) {
     const Schema schema = schemaOf(animals);
     EXPECT_TRUE(schema.isA("penguin", "ANIMAL"));
     EXPECT_TRUE(schema.isA("Bird", "Bird"));
@@ -84,7 +84,7 @@ TEST(ClassModel, KnowsAncestry) {
     EXPECT_THAT(names(schema.classes()), ElementsAre("Animal", "Bird", "Penguin", "Stone"));
 }
 
-TEST(ClassModel, OnlyTrueMakesAKeyOrAnAssociation) {
+TEST(ClassModel, AKeyOrAssociationHasTheQualifierWithTheValueTrue) {
     const Schema schema = schemaOf(R"(
         [Association(false)] class A { [Key(false)] string X; [Key(true)] string Y; };
         [Association] class B { [Key] A REF Left; [Key] A REF Right; };)");

@@ -23,7 +23,7 @@ void PrintTo(const BadMof& bad, std::ostream* out) {
 
 class MofError : public testing::TestWithParam<BadMof> {};
 
-TEST_P(MofError, HasAPositionAndTheExpectation) {
+TEST_P(MofError, NamesThePositionAndTheExpectedToken) {
     const std::string message = refusalOf(GetParam().text);
     EXPECT_THAT(message, StartsWith("test.mof:" + std::string(GetParam().position) + ": "));
     EXPECT_THAT(message, HasSubstr(GetParam().expected));
@@ -110,7 +110,7 @@ const BadMof meaning[] = {
 };
 INSTANTIATE_TEST_SUITE_P(Meaning, MofError, testing::ValuesIn(meaning), nameOf);
 
-TEST(MofErrorOfBytes, ANullCharacterIsNoPartOfAString) {
+TEST(MofErrorOfBytes, ANullCharacterIsInvalidInAString) {
     using namespace std::string_literals;
     EXPECT_THAT(refusalOf("class C { string A = \"a\0\"; };"s), StartsWith("test.mof:1:22: a string cannot hold"));
 }
@@ -141,7 +141,7 @@ TEST(MofFile, AnErrorInAnIncludedFileNamesThatFile) {
     }
 }
 
-TEST(MofFile, AnEmptyFileIsGood) {
+TEST(MofFile, AnEmptyFileIsValid) {
     const testsupport::TemporaryDirectory directory;
     Schema schema;
     MofReader(schema).readFile(directory.write("empty.mof", ""));

@@ -27,7 +27,7 @@ TEST(MofInstance, HasItsPropertiesAsWrittenThenTheDefaults) {
     EXPECT_EQ(formatObjectPath(shelf.path), "Shelf.Name=\"A\",Floor=2");
 }
 
-TEST(MofInstance, RefersToOthersByPathAndByAlias) {
+TEST(MofInstance, RefersToOtherInstancesByPathAndByAlias) {
     const Schema schema = schemaOf(classes + std::string(R"(
         instance of Shelf as $One { Name = "A"; Floor = 1; };
         instance of Beside { Left = $One; Right = "root/cimv2:Shelf.Name=\"B\",Floor=2"; };)"));

@@ -11,13 +11,13 @@ Value defaultOf(const std::string& declaration) {
     return schema.findClass("C")->properties.at(0).defaultValue;
 }
 
-TEST(MofReader, NothingAndCommentsDeclareNothing) {
+TEST(MofReader, AnEmptyFileOrCommentsDeclareNothing) {
     EXPECT_TRUE(schemaOf("").classes().empty());
     EXPECT_TRUE(schemaOf("// one\n/* two\n * lines */ // at the end").classes().empty());
     EXPECT_TRUE(schemaOf("\xEF\xBB\xBF// after a byte order mark").classes().empty());
 }
 
-TEST(MofReader, CommentsMaySeparateAnyTwoTokens) {
+TEST(MofReader, TokensMayBeSeparatedByComments) {
     const Schema schema = schemaOf("/**/[/**/Key/**/]//\nclass/**/C/**/{/**/[Key]string/**/K/*;*/;/**/}/**/;");
     EXPECT_TRUE(schema.findClass("C")->findProperty("K")->isKey());
 }
@@ -29,7 +29,7 @@ TEST(MofReader, KeywordsIgnoreLetterCase) {
     EXPECT_EQ(schema.findClass("B")->properties[0].type, CMPI_ref);
 }
 
-TEST(MofReader, KnowsEveryIntrinsicType) {
+TEST(MofReader, ReadsEveryIntrinsicType) {
     const std::pair<const char*, CMPIType> types[] = {
         {"boolean", CMPI_boolean}, {"char16", CMPI_char16}, {"string", CMPI_string}, {"datetime", CMPI_dateTime},
         {"uint8", CMPI_uint8},     {"uint16", CMPI_uint16}, {"uint32", CMPI_uint32}, {"uint64", CMPI_uint64},
@@ -140,7 +140,7 @@ TEST(MofReader, AFileMayDeclareAStandardQualifierItself) {
     EXPECT_FALSE(schema.findQualifier("key")->standard);
 }
 
-TEST(MofReader, KeepsMethodsByNameAndTheirParametersOutOfTheProperties) {
+TEST(MofReader, StoresMethodsByNameAndIgnoresTheirParameters) {
     const Schema schema = schemaOf(R"(
         class C {
             [Description("starts it")]
@@ -156,7 +156,7 @@ TEST(MofReader, KeepsMethodsByNameAndTheirParametersOutOfTheProperties) {
     EXPECT_EQ(c.properties[0].name, "Name");
 }
 
-TEST(MofReader, APropertyMayBeCalledLikeAKeyword) {
+TEST(MofReader, APropertyMayHaveTheNameOfAKeyword) {
     const Schema schema = schemaOf("class C { string Ref; string Class; uint8 Instance; C REF Of; };");
     EXPECT_EQ(schema.findClass("C")->properties[0].name, "Ref");
     EXPECT_EQ(schema.findClass("C")->properties[0].type, CMPI_string);
@@ -178,7 +178,7 @@ TEST(MofReader, IncludesAreRelativeToTheFileThatIncludes) {
     EXPECT_TRUE(schema.isA("Top", "Base"));
 }
 
-TEST(MofReader, AFileIsReadOnceHoweverOftenItIsNamed) {
+TEST(MofReader, AFileThatIsIncludedSeveralTimesIsReadOnce) {
     const testsupport::TemporaryDirectory directory;
     const auto base = directory.write("base.mof", "#pragma include (\"base.mof\")\nclass Base {};");
     const auto top = directory.write("top.mof", "#pragma include (\"base.mof\")\n#pragma include (\"./base.mof\")\n");

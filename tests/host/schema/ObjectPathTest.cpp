@@ -44,7 +44,7 @@ TEST(ObjectPath, HasNamespaceClassAndTypedKeys) {
     EXPECT_EQ(described(path.keys[2].value), described(Value::of(CMPI_sint8, std::int8_t{-3})));
 }
 
-TEST(ObjectPath, WithoutNamespaceTakesTheDefaultOne) {
+TEST(ObjectPath, WithoutNamespaceHasTheDefaultNamespace) {
     EXPECT_EQ(parse("Disk").nameSpace, "root/cimv2");
     EXPECT_EQ(parse(":Disk").nameSpace, "root/cimv2");
     EXPECT_EQ(parse(R"(Disk.ID="a:b/c.d=e")").nameSpace, "root/cimv2");
@@ -59,14 +59,14 @@ TEST(ObjectPath, MayNameAHostAndBeginWithASlash) {
     EXPECT_EQ(parse("/root/cimv2:Disk").nameSpace, "root/cimv2");
 }
 
-TEST(ObjectPath, KeepsTheUsersLetterCase) {
+TEST(ObjectPath, PreservesTheUsersLetterCase) {
     const ObjectPath path = parse(R"(dISK.iD="x")");
     EXPECT_EQ(path.className, "dISK");
     EXPECT_EQ(path.keys[0].name, "iD");
     EXPECT_EQ(path.keys[0].value.type, CMPI_string);
 }
 
-TEST(ObjectPath, StringKeysTakeEscapesAndAnyOtherByte) {
+TEST(ObjectPath, StringKeysMayContainEscapesAndAnyOtherByte) {
     const auto text = [](const std::string& path) { return element<std::string>(parse(path).keys.at(0).value); };
     EXPECT_EQ(text(R"(Disk.ID="a\"b\\c")"), "a\"b\\c");
     EXPECT_EQ(text(R"(Disk.ID="")"), "");
@@ -141,7 +141,7 @@ TEST(ObjectPathError, NumbersMustFitTheirType) {
     EXPECT_THAT(refusal("Slot.Upper=1"), HasSubstr("true or false"));
 }
 
-TEST(ObjectPathError, KeysMustBeTheClasssAndComeOnce) {
+TEST(ObjectPathError, KeysMustBelongToTheClassAndBeUnique) {
     EXPECT_THAT(refusal("Slot.Nummer=1"), HasSubstr("class Slot has no key Nummer; its keys are Number, Upper, Level"));
     EXPECT_THAT(refusal("Slot.Note=\"x\""), HasSubstr("no key Note"));
     EXPECT_THAT(refusal("Loose.Text=\"x\""), HasSubstr("it has no keys"));
@@ -187,7 +187,7 @@ INSTANTIATE_TEST_SUITE_P(
                     BadPath{"1Disk", "character 1"}, BadPath{"Disk.ID==\"x\"", "character 9"},
                     BadPath{"Disk.ID=\"\\xD800\"", "surrogate"}, BadPath{"Disk.ID=\"\\x0\"", "\\x0"}));
 
-TEST(ObjectPathError, ANullCharacterIsNoPartOfAKey) {
+TEST(ObjectPathError, ANullCharacterIsInvalidInAKey) {
     using namespace std::string_view_literals;
     EXPECT_NE(refusal(std::string("Disk.ID=\"a\0b\""sv)), "");
 }

@@ -70,7 +70,7 @@ TEST(Registration, ReadsManyStanzasWithCommentsBlanksAndCarriageReturns) {
     EXPECT_EQ(stanzas[1].source, "test.reg:9");
 }
 
-TEST(Registration, PassesOverKeywordsThatItDoesNotKnow) {
+TEST(Registration, IgnoresUnknownKeywords) {
     const auto stanzas = read(
         "[One]\nprovider: P\nlocation: L\ntype: instance indication\nnamespace: n\nuser: root\nparameters: a b: c\n");
     ASSERT_EQ(stanzas.size(), 1U);
@@ -92,7 +92,7 @@ TEST(RegistrationError, NamesFileAndLine) {
     EXPECT_THAT(messageOf("[One]\nlocation: a b\n"), StartsWith("test.reg:2: expected one word"));
 }
 
-TEST(RegistrationError, AStanzaMustSayWhichProviderInWhichLibraryServesWhichNamespace) {
+TEST(RegistrationError, AStanzaMustNameProviderLibraryAndNamespace) {
     EXPECT_THAT(messageOf("[One]\nlocation: L\nnamespace: n\n"),
                 StartsWith("test.reg:1: the section [One] has no line"));
     EXPECT_THAT(messageOf("[One]\nlocation: L\nnamespace: n\n"), HasSubstr("provider: NAME"));

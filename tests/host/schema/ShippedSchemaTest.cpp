@@ -45,7 +45,7 @@ TEST(ShippedSchema, HasTheClasses) {
     EXPECT_THAT(found, UnorderedElementsAreArray(classNames));
 }
 
-TEST(ShippedSchema, DescribesComputersByNameAndMake) {
+TEST(ShippedSchema, DescribesComputersByNameVendorAndModel) {
     EXPECT_THAT(shape(*shipped().findClass("VELKO_ComputerSystem")),
                 ElementsAre("Name string*", "Caption string", "Description string", "ElementName string",
                             "Vendor string", "Model string", "ProductName string"));

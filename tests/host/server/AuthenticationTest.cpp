@@ -15,7 +15,7 @@ using namespace cimhost::server;
 
 namespace {
 
-TEST(CredentialsTest, AreReadFromTheBasicScheme) {
+TEST(CredentialsTest, AreDecodedFromTheBasicScheme) {
     const auto found = credentialsFrom("Basic dXNlcjpwYTpzcw==");  // user:pa:ss
     ASSERT_TRUE(found);
     EXPECT_EQ(found->user, "user");
@@ -30,7 +30,7 @@ TEST(CredentialsTest, OtherValuesAreRefused) {
     }
 }
 
-/** A PAM service that asks a program, which accepts one user with one password from one client. */
+/** A PAM service that runs a program, which accepts one user with one password from one client. */
 class PamTest : public testing::Test {
 protected:
     PamTest() {
@@ -71,7 +71,7 @@ TEST(AccessRulesTest, UsersAndGroupsHaveRights) {
     EXPECT_EQ(rightOf("root", rules), Right::none);
 }
 
-TEST(AccessRulesTest, AGroupGivesItsMembersTheRight) {
+TEST(AccessRulesTest, MembersOfAGroupHaveItsRight) {
     const passwd* user = ::getpwuid(::getuid());
     ASSERT_NE(user, nullptr);
     const group* ownGroup = ::getgrgid(user->pw_gid);

@@ -14,7 +14,7 @@ namespace {
 
 using Phase = Connection::Phase;
 
-/** Connections with clients that do not send anything unless a test says so. */
+/** Connections whose clients send only what a test sends. */
 class ConnectionTableTest : public testing::Test {
 protected:
     ConnectionTableTest() {
@@ -48,7 +48,7 @@ protected:
         return added;
     }
 
-    /** Looks at the connections when a time has passed. */
+    /** Checks the connections as if this time had passed. */
     void endOverdueAfter(std::chrono::milliseconds time) { table.endOverdue(Connection::Clock::now() + time); }
 
     Limits limits;
@@ -56,7 +56,7 @@ protected:
     std::deque<Added> all;
 };
 
-TEST_F(ConnectionTableTest, ANewConnectionEndsTheOldestThatHasNotSentARequest) {
+TEST_F(ConnectionTableTest, ANewConnectionEndsTheOldestWithoutACompleteRequest) {
     const Added& trusted = addIn(Phase::idle, true);
     const Added& oldest = addIn(Phase::body);
     const Added& younger = addIn(Phase::idle);
@@ -143,7 +143,7 @@ TEST_F(ConnectionTableTest, ANetworkWithTooManyConnectionsLosesOneOfThem) {
     EXPECT_TRUE(other.isOpen() && second.isOpen() && third.isOpen());
 }
 
-TEST_F(ConnectionTableTest, ANetworkThatIsBusyWithAllItsConnectionsReceivesNoMore) {
+TEST_F(ConnectionTableTest, ANetworkWithOnlyBusyConnectionsReceivesNoMore) {
     limits.connections = 10;
     limits.connectionsPerAddress = 2;
     addIn(Phase::work);
@@ -176,7 +176,7 @@ TEST_F(ConnectionTableTest, TheAgeOfAHeadBeginsWithItsFirstByte) {
     EXPECT_TRUE(client.connection->hasPartOfHead());
 }
 
-TEST_F(ConnectionTableTest, AHeadIsNotAsOldAsThatOfTheRequestBefore) {
+TEST_F(ConnectionTableTest, TheAgeOfAHeadIsIndependentOfThePrecedingRequest) {
     const Added& client = add();
     client.sockets.client.send("POST / HT");
     pollfd arrived{client.sockets.server.get(), POLLIN, 0};

@@ -86,7 +86,7 @@ TEST_F(HeaderCheckTest, OnlyNamesOfTheLoopbackInterfaceAreHostsWithoutAuthentica
     EXPECT_EQ(with("Host", "server.example").result(), "200");
 }
 
-TEST_F(HeaderCheckTest, HeadersOfTheOperationMustBeThere) {
+TEST_F(HeaderCheckTest, HeadersOfTheOperationAreRequired) {
     EXPECT_EQ(with("CIMOperation", "MethodResponse").result(), "400 unsupported-operation");
     EXPECT_EQ(with("CIMOperation", "methodcall").result(), "200");
     EXPECT_EQ(with("CIMMethod", "").result(), "400 header-mismatch");
@@ -98,7 +98,7 @@ TEST_F(HeaderCheckTest, HeadersOfTheOperationMustBeThere) {
     EXPECT_EQ(result(), "400 header-mismatch");
 }
 
-TEST_F(HeaderCheckTest, ProtocolVersionsAndGroupsOfTheFutureAreRefused) {
+TEST_F(HeaderCheckTest, UnknownProtocolVersionsAndGroupsAreRefused) {
     EXPECT_EQ(with("CIMProtocolVersion", "1.4").result(), "200");
     for (const char* version : {"2.0", "1.", "1.x", "11.0"}) {
         EXPECT_EQ(with("CIMProtocolVersion", version).result(), "400 unsupported-protocol-version") << version;
@@ -107,7 +107,7 @@ TEST_F(HeaderCheckTest, ProtocolVersionsAndGroupsOfTheFutureAreRefused) {
     EXPECT_EQ(with("CIMBatch", "").with("CIMExport", "x").result(), "501 unsupported-operation");
 }
 
-TEST_F(HeaderCheckTest, HeadersThatAreThereTwiceAreRefused) {
+TEST_F(HeaderCheckTest, DuplicateHeadersAreRefused) {
     with("CIMProtocolVersion", "1.0");
     request.headers.emplace("CIMProtocolVersion", "2.0");
     EXPECT_EQ(result(), "400 unsupported-protocol-version");
@@ -137,7 +137,7 @@ TEST_F(HeaderCheckTest, TheOnlyExpectationIsToContinue) {
     EXPECT_EQ(result(), "417");
 }
 
-TEST_F(HeaderCheckTest, HeadsThatOtherSoftwareReadsDifferentlyAreRefused) {
+TEST_F(HeaderCheckTest, AmbiguousHeadsAreRefused) {
     const HttpRequest accepted = request;
     for (const auto& [name, value] : {std::pair{"Content-Length ", "100"},
                                       {"Content-Length", "100"},

@@ -54,13 +54,13 @@ protected:
         return client.receiveUntil("</CIM>\n");
     }
 
-    /** More than the buffers of both sockets take. */
+    /** A response that is larger than the buffers of both sockets. */
     static Response largeResponse() {
         Instance instance{{"", "root/test", "Thing", {{"Name", Value::of(std::string(20'000, 'a'))}}}, {}};
         return Response::ofInstances(std::vector<Instance>(2'000, instance));
     }
 
-    /** A client that has begun to receive a large response, and stops. */
+    /** A client that has received only the beginning of a large response. */
     Socket slowReader() {
         Socket client = connect();
         client.send(requestOf(reader));
@@ -299,7 +299,7 @@ TEST_F(HttpServerTest, ARequestWaitsForRunningOnes) {
     EXPECT_THAT(client.receiveUntil("</CIM>\n"), StartsWith("HTTP/1.1 200 "));
 }
 
-TEST_F(HttpServerTest, EnumerationsThatAreOpenAreLimited) {
+TEST_F(HttpServerTest, TheNumberOfOpenEnumerationsIsLimited) {
     settings.limits.enumerations.open = 2;
     manager.answerWith([](const Request&) {
         return Response::ofInstances({{{"", "root/test", "Thing", {{"Name", Value::of(std::string("a"))}}}, {}}});
@@ -334,7 +334,7 @@ TEST_F(HttpServerTest, IncompleteRequestsAreLogged) {
     EXPECT_EQ(std::count(lines.begin(), lines.end(), '\n'), 4) << lines;
 }
 
-TEST_F(HttpServerTest, StopEndsSlowReadersAfterTheTime) {
+TEST_F(HttpServerTest, StopEndsSlowReadersAfterTheTimeLimit) {
     manager.answerWith([](const Request&) { return largeResponse(); });
     const Socket reading = slowReader();
     EXPECT_TRUE(server().drain(0s));

@@ -60,7 +60,7 @@ TEST_F(PasswordQueueTest, NetworksTakeTurns) {
     EXPECT_THAT(turns, testing::ElementsAre("a1", "b1", "c1", "a2", "a3"));
 }
 
-TEST_F(PasswordQueueTest, ATurnThatDoesNotComeInTimeIsGivenToOthers) {
+TEST_F(PasswordQueueTest, AConnectionThatWaitsTooLongLosesItsTurn) {
     std::optional<PasswordQueue::Slot> first(std::in_place, queue, connect("a"), later());
     EXPECT_FALSE(PasswordQueue::Slot(queue, connect("b"), Connection::Clock::now()));
     EXPECT_EQ(queue.waiting(), 0U);

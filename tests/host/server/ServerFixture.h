@@ -14,7 +14,7 @@
 
 namespace cimhost::server::test {
 
-/** Counts how often it is asked, keeps the client's address, and accepts one password. */
+/** Accepts one password, counts the checks, and records the client's address. */
 class FakeAuthenticator : public Authenticator {
 public:
     bool accepts(const Credentials& credentials, const std::string& host) override {
@@ -28,7 +28,7 @@ public:
     std::function<void()> beforeAnswer = [] {};
 };
 
-/** Keeps the principal of the last request, and answers with a function. */
+/** Records the principal of the last request, and calls a function for the response. */
 class FakeManager : public UpCalls {
 public:
     using Answer = std::function<Response(const Request&)>;

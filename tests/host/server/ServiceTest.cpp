@@ -23,7 +23,7 @@ protected:
         settings.limits.connections = 10;
     }
 
-    /** Serves one operation, which does not end, and receives SIGTERM meanwhile. */
+    /** Serves one operation that does not end, and receives SIGTERM during it. */
     void stopDuringAnOperation() {
         blockSignals();
         manager.answerWith([](const Request&) -> Response {

@@ -44,7 +44,7 @@ std::string refusalOf(const Settings& settings) {
     return "accepted";
 }
 
-TEST_F(SettingsTest, WithoutKeysOnlyRootMayWriteAndNoOtherUserRead) {
+TEST_F(SettingsTest, WithoutKeysOnlyRootHasAccess) {
     const Settings settings = read("");
     EXPECT_THAT(settings.access.writers, ElementsAre("root"));
     EXPECT_TRUE(settings.access.readers.empty());

@@ -14,7 +14,7 @@
 
 namespace cimhost::server::test {
 
-/** A socket that is closed at the end. */
+/** A socket that the destructor closes. */
 class Socket {
 public:
     explicit Socket(int itsDescriptor) : descriptor(itsDescriptor) {}
@@ -32,7 +32,7 @@ public:
     }
 
     void send(const std::string& bytes) const {
-        // The server may have ended the connection: then a later receive() shows it.
+        // A failure is ignored: if the server has ended the connection, a later receive() returns nothing more.
         static_cast<void>(::send(descriptor, bytes.data(), bytes.size(), MSG_NOSIGNAL) < 0);
     }
 

@@ -9,7 +9,7 @@
 #include "lab/load/LoadClass.h"
 #include "model/Status.h"
 
-// Checks of responses. Each returns the first mismatch.
+// Checks of responses. Each function returns the first mismatch.
 
 namespace cimhost::lab {
 

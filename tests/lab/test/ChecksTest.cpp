@@ -36,7 +36,7 @@ protected:
     Expectation expectation{known, others, state, "load-c1-", "load-"};
 };
 
-TEST_F(ChecksTest, AStatusIsTheExpectedOne) {
+TEST_F(ChecksTest, ReportsAnUnexpectedStatus) {
     EXPECT_EQ(kindOf(checkStatus({}, CMPI_RC_OK)), "right");
     EXPECT_EQ(kindOf(checkStatus({CMPI_RC_ERR_NOT_FOUND, ""}, CMPI_RC_ERR_NOT_FOUND)), "right");
     const CheckResult failure = checkStatus({CMPI_RC_ERR_FAILED, "broken"}, CMPI_RC_OK);
@@ -49,14 +49,14 @@ TEST_F(ChecksTest, AStatusIsTheExpectedOne) {
     EXPECT_EQ(success->got, "OK");
 }
 
-TEST_F(ChecksTest, ACreatedPathIsTheRequestedOne) {
+TEST_F(ChecksTest, ReportsAnUnexpectedPathOfACreation) {
     EXPECT_EQ(kindOf(checkPath(known.instancePath("a"), known.instancePath("a"))), "right");
     EXPECT_EQ(kindOf(checkPath(known.instancePath("b"), known.instancePath("a"))), "path");
     EXPECT_EQ(kindOf(checkPath(inventoryPath("Inventory_Thing"), known.instancePath("a"))), "path");
     EXPECT_EQ(kindOf(checkPath(inventoryClass("Inventory_Liar").instancePath("a"), known.instancePath("a"))), "path");
 }
 
-TEST_F(ChecksTest, AnInstanceHasItsKeyAndTheExpectedValues) {
+TEST_F(ChecksTest, ReportsUnexpectedKeysAndValuesOfAnInstance) {
     const ExpectedState::Values values{{"Text", testsupport::text("x")}};
     const auto text = [](const char* value) { return testsupport::named("Text", testsupport::text(value)); };
     EXPECT_EQ(kindOf(checkInstance(known, thing("a", {text("x")}), "a", values)), "right");
@@ -69,7 +69,7 @@ TEST_F(ChecksTest, AnInstanceHasItsKeyAndTheExpectedValues) {
         << "no key";
 }
 
-TEST_F(ChecksTest, AListingHasAllExpectedInstances) {
+TEST_F(ChecksTest, ReportsInstancesThatAnEnumerationLacks) {
     EXPECT_EQ(listing({}), "right");
     EXPECT_EQ(listing({}, true), "right");
     EXPECT_EQ(kindOf(checkListing(expectation, {}, false)), "missing");
@@ -77,7 +77,7 @@ TEST_F(ChecksTest, AListingHasAllExpectedInstances) {
     EXPECT_EQ(kindOf(checkListing(expectation, {thing("load-c1-1"), thing("load-c1-2")}, false)), "missing");
 }
 
-TEST_F(ChecksTest, AListingHasNoDuplicateAndNoOtherInstance) {
+TEST_F(ChecksTest, ReportsDuplicateAndUnexpectedInstancesOfAnEnumeration) {
     EXPECT_EQ(listing({thing("load-c1-1")}), "duplicate");
     EXPECT_EQ(listing({thing("load-c1-4")}), "deleted");
     EXPECT_EQ(listing({thing("load-c1-3")}), "right") << "doubtful";
@@ -87,14 +87,14 @@ TEST_F(ChecksTest, AListingHasNoDuplicateAndNoOtherInstance) {
     EXPECT_EQ(listing({{inventoryPath("Inventory_Thing"), {}}}), "nameless");
 }
 
-TEST_F(ChecksTest, AListingOfInstancesHasTheirValues) {
+TEST_F(ChecksTest, ReportsUnexpectedValuesOfAnEnumeration) {
     const std::vector<Instance> wrong{
         thing("old"), thing("load-c1-1", {testsupport::named("Text", testsupport::text("y"))}), thing("load-c1-2")};
     EXPECT_EQ(kindOf(checkListing(expectation, wrong, true)), "value");
     EXPECT_EQ(kindOf(checkListing(expectation, wrong, false)), "right");
 }
 
-TEST_F(ChecksTest, AssociationsAreTheSameAsBefore) {
+TEST_F(ChecksTest, ReportsAssociationsThatChange) {
     EXPECT_EQ(kindOf(checkAssociated({"a", "b"}, {"a", "b"})), "right");
     const CheckResult mismatch = checkAssociated({}, {"a", "b"});
     ASSERT_TRUE(mismatch);

@@ -111,7 +111,7 @@ TEST_F(EmulationTest, ManagersHaveNames) {
     }
 }
 
-TEST_F(EmulationTest, TheBrokerHasVersionsAndGaps) {
+TEST_F(EmulationTest, TheBrokerHasTheVersionsAndMissingFunctionsOfTheManager) {
     as(Manager::standard);
     EXPECT_EQ(reported("Echo_Broker"), "version 200/200");
     as(Manager::sfcb);
@@ -129,7 +129,7 @@ TEST_F(EmulationTest, ThePrincipalIsEmptyOrLacksCharacters) {
     EXPECT_THAT(seenOfEnumeration(), HasSubstr("CMPIPrincipal=;CMPIRole=(error 12)"));
 }
 
-TEST_F(EmulationTest, AGivenPrincipalIsUnchanged) {
+TEST_F(EmulationTest, AConfiguredPrincipalIsUnchanged) {
     as(Manager::sfcb);
     manager().perform(Request::enumerateInstances(classPath("Echo_Thing")).with({with(CMPIPrincipal, text("anna"))}));
     EXPECT_THAT(seen(), HasSubstr("CMPIPrincipal=anna;"));
@@ -158,7 +158,7 @@ TEST_F(EmulationTest, ACreationMayHaveAnEmptyKey) {
     EXPECT_EQ(seenOfCreation({with("Text", text("t"))}), "Echo_Thing.Name=; Name=a;Text=t;Size=(null);");
 }
 
-TEST_F(EmulationTest, APathWithoutKeysTakesThemFromTheInstance) {
+TEST_F(EmulationTest, APathWithoutKeysMayReceiveThoseOfTheInstance) {
     as(Manager::sfcb);
     ASSERT_TRUE(
         manager().perform(Request::createInstance(classPath("Echo_Thing"), {{}, {with("Name", text("b"))}})).ok());

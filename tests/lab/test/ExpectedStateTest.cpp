@@ -10,7 +10,7 @@ using cimhost::lab::Random;
 using testing::ElementsAre;
 using testing::Key;
 
-TEST(ExpectedState, StoresChanges) {
+TEST(ExpectedState, RecordsChanges) {
     ExpectedState state;
     EXPECT_TRUE(state.isEmpty());
     state.created("a", {});

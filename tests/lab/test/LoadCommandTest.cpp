@@ -79,7 +79,7 @@ TEST(LoadCommand, ShowsTenWrongResponsesOrAll) {
     EXPECT_EQ(shownBy({"--show", "0"}), 0U);
 }
 
-TEST(LoadCommand, TakesClassesMixAndAssociations) {
+TEST(LoadCommand, AcceptsClassesMixAndAssociations) {
     const auto report =
         reportOf({"load", "Inventory_Thing", "Inventory_Sealed", "--mix", "create=1,associate=1", "--source",
                   "Inventory_Thing.Name=\"x\"", "--assoc-class", "Inventory_Holds", "--requests", "100"},
@@ -122,7 +122,7 @@ TEST(LoadCommand, ReportsErrorsOfTheCommandLine) {
     }
 }
 
-TEST(LoadCommand, HelpExplainsProvidersWithoutConcurrency) {
+TEST(LoadCommand, HelpDescribesProvidersThatDoNotSupportConcurrency) {
     const std::string help = runBare({"load", "--help"}).output;
     EXPECT_THAT(help, AllOf(HasSubstr("--clients"), HasSubstr("does not support this returns wrong responses"),
                             HasSubstr("exit status"), HasSubstr("--assoc-class")));

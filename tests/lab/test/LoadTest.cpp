@@ -5,7 +5,7 @@
 #include "lab/test/Inventory.h"
 #include "operations/LoadedLibrary.h"
 
-// Loads of correct and of defective providers. The mismatches are deterministic.
+// Loads of correct and of defective providers. The wrong responses are the same in each run.
 
 namespace {
 

@@ -56,7 +56,7 @@ TEST(Mix, RejectsInvalidLists) {
     EXPECT_THAT(errorOf([] { Mix(""); }), HasSubstr("are 0"));
 }
 
-TEST(LoadClass, TakesKeyAndModifiablePropertiesFromTheSchema) {
+TEST(LoadClass, ReadsKeyAndModifiablePropertiesFromTheSchema) {
     const LoadClass thing = inventoryClass("inventory_thing");
     EXPECT_EQ(thing.key, "Name");
     std::vector<std::string> names;
