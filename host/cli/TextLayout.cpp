@@ -64,14 +64,14 @@ private:
 constexpr std::size_t gap = 2;              ///< spaces between columns
 constexpr std::size_t leastLastWidth = 16;  ///< the last column needs at least this width
 
-/** The end of the longest part that fits into the room: after its last space, if it has one. */
-std::size_t endOfPart(const std::string& text, std::size_t begin, std::size_t room) {
+/** The end of the longest part that is not wider than the limit: after its last space, if it has one. */
+std::size_t endOfPart(const std::string& text, std::size_t begin, std::size_t limit) {
     std::size_t afterBlank = begin;
     std::size_t width = 0;
     for (std::size_t position = begin; position < text.size();) {
         const CharacterSize next = sizeOfFirst(std::string_view(text).substr(position));
         width += next.columns;
-        if (width > room && position > begin) {
+        if (width > limit && position > begin) {
             return afterBlank > begin ? afterBlank : position;
         }
         position += next.bytes;

@@ -114,7 +114,7 @@ TEST_F(AgentIdentityTest, ItIsInTheRequestsNamespace) {
     EXPECT_EQ(paths[0].nameSpace, "root/other");
 }
 
-TEST_F(AgentIdentityTest, TheInstanceIsReturnedForAllItsKeys) {
+TEST_F(AgentIdentityTest, TheInstanceIsReturnedIfAllKeysAreEqual) {
     EXPECT_TRUE(isTheAgent(keys()));
     const auto got = provider().getInstance(path(keys())).instances();
     const auto enumerated = provider().enumerateInstances(classPath(identityClass)).instances();

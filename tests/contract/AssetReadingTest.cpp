@@ -123,7 +123,7 @@ TEST_F(AssetReadingTest, ThePropertyListIsNotApplied) {
     EXPECT_EQ(outcome.instances()[0].properties.size(), 33U);
 }
 
-TEST_F(AssetReadingTest, TheInstanceIsReturnedForAllItsKeys) {
+TEST_F(AssetReadingTest, TheInstanceIsReturnedIfAllKeysAreEqual) {
     const Outcome outcome = provider().getInstance(path(keys()));
     EXPECT_THAT(outcome, isOk(1));
     EXPECT_EQ(outcome.instances().size(), 1U);
