@@ -61,8 +61,8 @@ TEST_F(AssetFaultTest, EveryFailureKeepsTheSymbolicLinkAndTheMode) {
 }
 
 TEST_F(AssetFaultTest, AFullDiskKeepsTheFileUnchanged) {
-    for (const Failure& failure :
-         {Failure{operationWrite, ENOSPC}, Failure{operationSync, EIO}, Failure{operationRename, ENOSPC}}) {
+    for (const InjectedFailure& failure : {InjectedFailure{operationWrite, ENOSPC}, InjectedFailure{operationSync, EIO},
+                                           InjectedFailure{operationRename, ENOSPC}}) {
         const Fault fault{failure.kind, 1, true, failure.error};
         environment.restart();
         environment.ask(request, &fault);
@@ -109,7 +109,7 @@ TEST_F(AssetFaultTest, OnlyAnUnreadableFileLosesUnsetValues) {
 TEST_F(AssetFaultTest, ASecondFailureLeavesAtMostATemporaryFile) {
     int left = 0;
     const auto failTwice = [&](const Fault& first) {
-        for (const Failure& second : fileFailures()) {
+        for (const InjectedFailure& second : fileFailures()) {
             if (second.error == EINTR) {
                 continue;  // would be retried forever
             }

@@ -164,8 +164,8 @@ Counts FaultInjection::counts() const {
     return counts;
 }
 
-const std::vector<Failure>& fileFailures() {
-    static const std::vector<Failure> all{
+const std::vector<InjectedFailure>& fileFailures() {
+    static const std::vector<InjectedFailure> all{
         {operationOpen, EMFILE},   {operationOpen, EACCES},      {operationRead, EIO},       {operationRead, EINTR},
         {operationRead, 0},        {operationWrite, ENOSPC},     {operationWrite, EINTR},    {operationWrite, 0},
         {operationSync, EIO},      {operationRename, ENOSPC},    {operationRemove, EACCES},  {operationClose, EIO},
@@ -175,22 +175,22 @@ const std::vector<Failure>& fileFailures() {
     return all;
 }
 
-const std::vector<Failure>& memoryFailures() {
-    static const std::vector<Failure> all{{operationAllocate, 0}, {operationTakeMemory, ENOMEM}};
+const std::vector<InjectedFailure>& memoryFailures() {
+    static const std::vector<InjectedFailure> all{{operationAllocate, 0}, {operationTakeMemory, ENOMEM}};
     return all;
 }
 
-std::vector<Failure> allFailures() {
-    std::vector<Failure> all = fileFailures();
+std::vector<InjectedFailure> allFailures() {
+    std::vector<InjectedFailure> all = fileFailures();
     all.insert(all.end(), memoryFailures().begin(), memoryFailures().end());
     return all;
 }
 
-void eachFault(const Counts& counts, const std::vector<Failure>& failures,
+void eachFault(const Counts& counts, const std::vector<InjectedFailure>& failures,
                const std::function<void(const Fault&)>& body, const FaultSelection& selection) {
     const int most =
         selection.withSanitizers ? selection.operations : std::min(selection.operations, maximumOperations());
-    for (const Failure& failure : failures) {
+    for (const InjectedFailure& failure : failures) {
         const int count = counts.at(failure.kind);
         const int step = 1 + (count - 1) / most;
         for (const bool lasting : {false, true}) {
@@ -205,7 +205,7 @@ void eachFault(const Counts& counts, const std::vector<Failure>& failures,
 }
 
 void eachMoment(const Counts& counts, const std::function<void(const Fault&)>& body) {
-    std::vector<Failure> kinds;
+    std::vector<InjectedFailure> kinds;
     for (const auto& each : onFiles(counts)) {
         kinds.push_back({each.first, 0});
     }

@@ -28,7 +28,7 @@ constexpr OperationKind anyOnFiles = operationKinds;
  * A kind of operation and the errno value of its failure. 0 makes an allocation fail and other operations succeed
  * partially.
  */
-struct Failure {
+struct InjectedFailure {
     OperationKind kind;
     int error;
 };
@@ -38,13 +38,13 @@ struct Fault {
     OperationKind kind = operationAllocate;
     int number = 1;
     bool lasting = false;  ///< all later operations of the kind fail, too
-    int error = 0;         ///< see Failure
+    int error = 0;         ///< see InjectedFailure
 
     /** Called at that operation instead of a failure. */
     std::function<void()> instead{};
 
     /** A further failure of every operation of its kind after the first failure. */
-    std::optional<Failure> then{};
+    std::optional<InjectedFailure> then{};
 };
 
 std::ostream& operator<<(std::ostream& stream, const Fault& fault);
@@ -74,9 +74,9 @@ private:
 };
 
 /** Return the tested failures of the kinds that use files, or that allocate memory. */
-const std::vector<Failure>& fileFailures();
-const std::vector<Failure>& memoryFailures();
-std::vector<Failure> allFailures();
+const std::vector<InjectedFailure>& fileFailures();
+const std::vector<InjectedFailure>& memoryFailures();
+std::vector<InjectedFailure> allFailures();
 
 /** Selects faults. */
 struct FaultSelection {
@@ -89,7 +89,7 @@ struct FaultSelection {
  * Calls `body` with each fault of a request with these counts: every failure of each operation. Stops when the test
  * fails. Omits lasting interruptions (EINTR), since interrupted calls may be retried forever.
  */
-void eachFault(const Counts& counts, const std::vector<Failure>& failures,
+void eachFault(const Counts& counts, const std::vector<InjectedFailure>& failures,
                const std::function<void(const Fault&)>& body, const FaultSelection& selection = {});
 
 /** Calls `body` with a fault for each operation on files, as the time of another event. The faults have no error. */

@@ -19,7 +19,7 @@ constexpr int preparedRecords = 4;
 constexpr FaultSelection someOnce{false, 200};  ///< selects allocations
 
 /** Does not include malloc: the C library cannot load libraries correctly after it has run out of memory. */
-const std::vector<Failure> allocationFailures{{operationAllocate, 0}};
+const std::vector<InjectedFailure> allocationFailures{{operationAllocate, 0}};
 
 class GateLoadFaultTest : public testing::Test {
 protected:

@@ -60,7 +60,7 @@ protected:
      * Expects all or no records of each class after each fault, and all records if the failed call only has to be
      * repeated.
      */
-    void failEach(const std::vector<Failure>& failures, const FaultSelection& selection) {
+    void failEach(const std::vector<InjectedFailure>& failures, const FaultSelection& selection) {
         const Counts counts = load(nullptr);
         const Lines allLeases = leases;
         const Lines allWarranties = warranties;

@@ -23,14 +23,15 @@ std::optional<InjectedResult> Recording::note(RecordedCall call, const void* obj
     const int number = ++counts[call.function];
     const std::string name = call.arguments.empty() ? std::string{} : cim::foldedName(call.arguments.front());
     const auto byName = dataByName.find({call.function, name});
-    const std::vector<Failure>& ofFunction = failures[call.function];
+    const std::vector<InjectedFailure>& ofFunction = failures[call.function];
     const bool isSilent = call.function == "CMPIStringFT.getCharPtr" && silent.count(object) != 0;
     made.push_back(std::move(call));
     if (isSilent) {
         return InjectedResult{};
     }
-    const auto due = std::find_if(ofFunction.rbegin(), ofFunction.rend(),
-                                  [&](const Failure& failure) { return !failure.number || *failure.number == number; });
+    const auto due = std::find_if(ofFunction.rbegin(), ofFunction.rend(), [&](const InjectedFailure& failure) {
+        return !failure.number || *failure.number == number;
+    });
     if (due != ofFunction.rend()) {
         return due->result;
     }

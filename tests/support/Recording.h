@@ -60,7 +60,7 @@ public:
     void forget();
 
 private:
-    struct Failure {
+    struct InjectedFailure {
         std::optional<int> number{};  ///< number of the call since the beginning
         InjectedResult result{};
     };
@@ -68,7 +68,7 @@ private:
     mutable std::mutex mutex;
     std::vector<RecordedCall> made;
     std::map<std::string, int> counts;  ///< calls of each function since the beginning
-    std::map<std::string, std::vector<Failure>> failures;
+    std::map<std::string, std::vector<InjectedFailure>> failures;
     std::map<std::pair<std::string, std::string>, InjectedResult> dataByName;  ///< by function and name in lower case
     std::map<std::string, CMPIValueState> states;                              ///< by function
     std::set<const void*> silent;                                              ///< strings without characters
